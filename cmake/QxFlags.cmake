@@ -1,0 +1,23 @@
+# Flags that are part of the contract on every target: the order of arithmetic written in the
+# code is the order executed. No fast-math in any form.
+add_library(qxflags INTERFACE)
+target_compile_options(qxflags INTERFACE -ffp-contract=off -fno-math-errno -fvisibility=hidden
+    $<$<COMPILE_LANGUAGE:CXX>:-fvisibility-inlines-hidden> -Wall -Wextra -Wshadow)
+
+# A constant argument must meet the module's own mathematics library, not the compiler's.
+foreach(function IN ITEMS sin cos tan asin acos atan atan2 sinh cosh tanh exp exp2 expm1 log log2
+        log10 log1p pow cbrt hypot fmod)
+    target_compile_options(qxflags INTERFACE -fno-builtin-${function})
+endforeach()
+
+if(CMAKE_SIZEOF_VOID_P EQUAL 4)
+    target_compile_options(qxflags INTERFACE -msse2 -mfpmath=sse -mstackrealign)
+endif()
+if(NOT QX_ARCH STREQUAL "baseline")
+    target_compile_options(qxflags INTERFACE -march=${QX_ARCH})
+endif()
+if(QX_SANITIZE)
+    target_compile_options(qxflags INTERFACE -fsanitize=${QX_SANITIZE} -fno-omit-frame-pointer
+        -fno-sanitize-recover=all)
+    target_link_options(qxflags INTERFACE -fsanitize=${QX_SANITIZE})
+endif()

@@ -1,0 +1,1 @@
+#include "qx/types.h"

@@ -1,0 +1,9 @@
+#ifndef QX_QX_H
+#define QX_QX_H
+
+/* Every export of the module. */
+
+#include "qx/errors.h"
+#include "qx/types.h"
+
+#endif
