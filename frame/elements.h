@@ -19,14 +19,36 @@ enum class ElementType : int32_t {
     CDB = QXTypeCDB,
 };
 
-template <ElementType Code> struct Element;
-template <> struct Element<ElementType::I32> { typedef ::I32 type; };
-template <> struct Element<ElementType::U8> { typedef ::U8 type; };
-template <> struct Element<ElementType::U32> { typedef ::U32 type; };
-template <> struct Element<ElementType::SGL> { typedef ::SGL type; };
-template <> struct Element<ElementType::DBL> { typedef ::DBL type; };
-template <> struct Element<ElementType::CSG> { typedef ::CSG type; };
-template <> struct Element<ElementType::CDB> { typedef ::CDB type; };
+template <ElementType Code>
+struct Element;
+template <>
+struct Element<ElementType::I32> {
+    typedef ::I32 type;
+};
+template <>
+struct Element<ElementType::U8> {
+    typedef ::U8 type;
+};
+template <>
+struct Element<ElementType::U32> {
+    typedef ::U32 type;
+};
+template <>
+struct Element<ElementType::SGL> {
+    typedef ::SGL type;
+};
+template <>
+struct Element<ElementType::DBL> {
+    typedef ::DBL type;
+};
+template <>
+struct Element<ElementType::CSG> {
+    typedef ::CSG type;
+};
+template <>
+struct Element<ElementType::CDB> {
+    typedef ::CDB type;
+};
 
 } // namespace qx
 

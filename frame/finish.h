@@ -35,14 +35,16 @@ inline ErrorCode LastFailed(std::initializer_list<Check> checks) {
 
 // The end of a frame: a failure empties every output, in argument order, also those that were
 // not reached; success and warnings leave them.
-template <class... Outputs> ErrorCode Finish(ErrorCode status, const Outputs &...outputs) {
+template <class... Outputs>
+ErrorCode Finish(ErrorCode status, const Outputs &...outputs) {
     if (status < 0)
         (outputs.empty(), ...);
     return status;
 }
 
 // The end of a transform frame, whose status may be the host's own: anything but 0 empties.
-template <class... Outputs> ErrorCode FinishTransform(int32_t status, const Outputs &...outputs) {
+template <class... Outputs>
+ErrorCode FinishTransform(int32_t status, const Outputs &...outputs) {
     if (status != 0)
         (outputs.empty(), ...);
     return status;

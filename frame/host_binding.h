@@ -6,7 +6,8 @@
 namespace qx {
 
 // The two functions of the host's run-time. The module cannot know at build time which module
-// of the process holds them, so each is bound by name at its first call.
+// of the process holds them, so each is bound by name at its first call. A process in which
+// they cannot be found ends there, with a message.
 
 // Resizes a block to `count` elements and may move it: 0, or a host status. A frame writes the
 // dimension fields itself after a success.
@@ -18,6 +19,9 @@ enum SweepMode : int32_t { SweepWithdraw = 0, SweepForProcess = 1, SweepForObjec
 // Registers or withdraws a procedure that the host calls as procedure(argument) when it cleans
 // up after an aborted run.
 int32_t HostRegisterSweep(SweepProcedure procedure, void *argument, int32_t mode);
+
+// Names the module that holds the host's functions, ahead of every other place.
+void *SetHostModule(void *module);
 
 } // namespace qx
 

@@ -1,24 +1,169 @@
 #include "frame/scratch.h"
 
+#include "frame/workspace.h"
+
+#include <algorithm>
 #include <cstdlib>
+#include <cstring>
 
 namespace qx {
 
+namespace {
+
+enum Mode : int32_t { TableHeap = 1, Workspace = 2, PlainHeap = 3 };
+
+// Directly before the pointer that the caller gets.
+struct FrontHeader {
+    I32 totalSize; // of header and payload, as first requested
+    I32 mode;      // where the block came from
+};
+constexpr int32_t frontSize = sizeof(FrontHeader);
+static_assert(frontSize == 8);
+
+struct HeapTable {
+    void *(*allocate)(std::size_t);
+    void *(*reallocate)(void *, std::size_t);
+    void (*release)(void *);
+};
+
+// Empty until the process attach; static initialisers that run before it are served by the
+// plain heap, and what they took goes back there.
+HeapTable heapTable;
+std::atomic<int32_t> defaultMode = 0;
+
+Mode ModeOfNewBlock() {
+    if (analysisWorkspace.isEnabled())
+        return Workspace;
+    int32_t mode = defaultMode.load(std::memory_order_relaxed);
+    if (mode == 0) {
+        mode = PlainHeap;
+        defaultMode.store(mode, std::memory_order_relaxed);
+    }
+    return static_cast<Mode>(mode);
+}
+
+bool IsTooLarge(int32_t size) {
+    return size < 0 || size > std::numeric_limits<int32_t>::max() - frontSize;
+}
+
+void *TakeFrom(Mode mode, int32_t total) {
+    const auto bytes = static_cast<std::size_t>(total);
+    if (mode == Workspace) {
+        // Exhaustion reaches the caller as a null pointer, like every other failure.
+        void *payload;
+        analysisWorkspace.allocate(total, &payload);
+        return payload;
+    }
+    return mode == TableHeap ? heapTable.allocate(bytes) : std::malloc(bytes);
+}
+
+void GiveBackTo(int32_t mode, void *front) {
+    if (mode == TableHeap)
+        heapTable.release(front);
+    else if (mode == Workspace)
+        analysisWorkspace.release(front);
+    else
+        std::free(front);
+}
+
+FrontHeader *HeaderOf(void *block) { return static_cast<FrontHeader *>(block) - 1; }
+
+// Resizes within the block's own source; null if that failed. The region has then already lost
+// the old block: the caller's export fails and does not use it again.
+FrontHeader *ResizeInPlace(FrontHeader *front, int32_t mode, int32_t total) {
+    if (mode == Workspace) {
+        void *payload = front;
+        analysisWorkspace.resize(&payload, total);
+        return static_cast<FrontHeader *>(payload);
+    }
+    // A smaller block stays as it is, so that the block is never smaller than totalSize says.
+    if (total <= front->totalSize)
+        return front;
+    const auto bytes = static_cast<std::size_t>(total);
+    void *grown =
+        mode == TableHeap ? heapTable.reallocate(front, bytes) : std::realloc(front, bytes);
+    return static_cast<FrontHeader *>(grown);
+}
+
+} // namespace
+
+void AttachScratchHeap() {
+    heapTable = {std::malloc, std::realloc, std::free};
+    defaultMode.store(TableHeap, std::memory_order_relaxed);
+}
+
 ErrorCode ScratchAlloc(void **block, int32_t size) {
-    *block = std::malloc(static_cast<std::size_t>(size));
-    return *block != nullptr ? 0 : ErrOutOfMemory;
+    *block = nullptr;
+    if (IsTooLarge(size))
+        return ErrOutOfMemory;
+    const Mode mode = ModeOfNewBlock();
+    const int32_t total = size + frontSize;
+    auto *front = static_cast<FrontHeader *>(TakeFrom(mode, total));
+    if (front == nullptr)
+        return ErrOutOfMemory;
+    *front = {total, mode};
+    *block = front + 1;
+    return 0;
 }
+
 ErrorCode ScratchAlloc(void **block, int32_t size, int32_t) { return ScratchAlloc(block, size); }
-void *ScratchAllocPointer(int32_t size) { return std::malloc(static_cast<std::size_t>(size)); }
+
+void *ScratchAllocPointer(int32_t size) {
+    void *block;
+    ScratchAlloc(&block, size);
+    return block;
+}
+
 ErrorCode ScratchFree(void *block) {
-    std::free(block);
+    if (block != nullptr)
+        GiveBackTo(HeaderOf(block)->mode, HeaderOf(block));
     return 0;
 }
+
 ErrorCode ScratchRealloc(void **block, int32_t size) {
-    *block = std::realloc(*block, static_cast<std::size_t>(size));
+    if (size == 0) {
+        ScratchFree(*block);
+        *block = nullptr;
+        return 0;
+    }
+    if (*block == nullptr)
+        return ScratchAlloc(block, size);
+    if (IsTooLarge(size))
+        return ErrOutOfMemory;
+
+    FrontHeader *front = HeaderOf(*block);
+    const FrontHeader old = *front;
+    const Mode mode = ModeOfNewBlock();
+    const int32_t total = size + frontSize;
+    if (mode == old.mode) {
+        FrontHeader *resized = ResizeInPlace(front, mode, total);
+        if (resized == nullptr)
+            return ErrOutOfMemory;
+        // kept: totalSize stays that of the first request, so a later move to another source
+        // copies no more than that.
+        *resized = old;
+        *block = resized + 1;
+        return 0;
+    }
+
+    void *moved;
+    if (const ErrorCode status = ScratchAlloc(&moved, size))
+        return status;
+    std::memcpy(moved, *block,
+                static_cast<std::size_t>(std::min<int32_t>(old.totalSize, total) - frontSize));
+    GiveBackTo(old.mode, front);
+    *block = moved;
     return 0;
 }
-void *RawAlloc(int32_t size, int32_t) { return std::malloc(static_cast<std::size_t>(size)); }
+
+ErrorCode ScratchRealloc(void **block, int32_t size, int32_t) {
+    return ScratchRealloc(block, size);
+}
+
+void *RawAlloc(int32_t size, int32_t) {
+    return size < 0 ? nullptr : std::malloc(static_cast<std::size_t>(size));
+}
+
 void RawFree(void *block) { std::free(block); }
 
 } // namespace qx

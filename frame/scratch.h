@@ -28,6 +28,10 @@ ErrorCode ScratchRealloc(void **block, int32_t size, int32_t ignored);
 void *RawAlloc(int32_t size, int32_t alignment);
 void RawFree(void *block);
 
+// At process attach: from here on the table of heap functions serves what the workspace does
+// not. Blocks taken earlier go back to where they came from.
+void AttachScratchHeap();
+
 // The rule for a clean-up status: a failure stands, a failing clean-up replaces success and
 // warnings, a positive clean-up status replaces success only.
 inline ErrorCode Merge(ErrorCode status, ErrorCode cleanUp) {
@@ -65,7 +69,8 @@ private:
 };
 
 // A scratch block of `count` elements: Scratch<ElementType::DBL> work; work.allocate(n);
-template <ElementType Code> class Scratch {
+template <ElementType Code>
+class Scratch {
 public:
     typedef typename Element<Code>::type T;
 

@@ -12,7 +12,8 @@ namespace qx {
 // Views of host arrays. They hold the handle and read the block through it at every use, so
 // that no pointer outlives a resize. Handles are never null and are not tested.
 
-template <ElementType Code> class In1D {
+template <ElementType Code>
+class In1D {
 public:
     typedef typename Element<Code>::type T;
 
@@ -24,7 +25,8 @@ private:
     Array1DHandle handle_;
 };
 
-template <ElementType Code> class In2D {
+template <ElementType Code>
+class In2D {
 public:
     typedef typename Element<Code>::type T;
 
@@ -43,7 +45,8 @@ private:
 //
 // A view takes the address of the frame's own handle argument, because the host is given that
 // address and may replace the handle itself.
-template <ElementType Code, ElementType EmptyCode = Code> class Out1D {
+template <ElementType Code, ElementType EmptyCode = Code>
+class Out1D {
 public:
     typedef typename Element<Code>::type T;
 
@@ -53,8 +56,7 @@ public:
 
     // Resizes to `count` elements: 0 or the host's own status.
     int32_t reshape(int32_t count) const {
-        const int32_t hostStatus =
-            HostBlockReshape(static_cast<int32_t>(Code), 1, &handle_, count);
+        const int32_t hostStatus = HostBlockReshape(static_cast<int32_t>(Code), 1, &handle_, count);
         if (hostStatus == 0)
             (*handle_)->dimSize = count;
         return hostStatus;
@@ -72,7 +74,8 @@ private:
     Array1DHandle &handle_;
 };
 
-template <ElementType Code, ElementType EmptyCode = Code> class Out2D {
+template <ElementType Code, ElementType EmptyCode = Code>
+class Out2D {
 public:
     typedef typename Element<Code>::type T;
 
@@ -87,8 +90,8 @@ public:
         const int64_t count = int64_t{rows} * cols;
         if (count > std::numeric_limits<int32_t>::max())
             return ErrOutOfMemory;
-        const int32_t hostStatus = HostBlockReshape(static_cast<int32_t>(Code), 2, &handle_,
-                                                    static_cast<int32_t>(count));
+        const int32_t hostStatus =
+            HostBlockReshape(static_cast<int32_t>(Code), 2, &handle_, static_cast<int32_t>(count));
         if (hostStatus == 0)
             setSizes(rows, cols);
         return hostStatus;
@@ -112,8 +115,10 @@ private:
 };
 
 // An array that is input and output at once is an output whose content is read first.
-template <ElementType Code> using InOut1D = Out1D<Code>;
-template <ElementType Code> using InOut2D = Out2D<Code>;
+template <ElementType Code>
+using InOut1D = Out1D<Code>;
+template <ElementType Code>
+using InOut2D = Out2D<Code>;
 
 } // namespace qx
 

@@ -1,8 +1,8 @@
 #ifndef QX_ERRORS_H
 #define QX_ERRORS_H
 
-/* Every code that an export can return, apart from a host status passed on untranslated. The numbers
-   are a fixed interface and never change; the texts belong to the host. */
+/* Every code that an export can return, apart from a host status passed on untranslated. The
+   numbers are a fixed interface and never change; the texts belong to the host. */
 
 enum QXErrorCode {
     QXSuccess = 0,

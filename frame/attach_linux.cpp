@@ -1,0 +1,5 @@
+#include "frame/scratch.h"
+
+// Process attach. Runs after the static initialisers that carry a priority, which take their
+// memory before it.
+__attribute__((constructor)) static void AttachProcess() { qx::AttachScratchHeap(); }

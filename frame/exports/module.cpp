@@ -1,1 +1,0 @@
-#include "qx/types.h"

@@ -1,0 +1,69 @@
+#include "frame/platform.h"
+
+#include <dlfcn.h>
+#include <link.h>
+#include <pthread.h>
+#include <sys/uio.h>
+#include <unistd.h>
+
+#include <cstdlib>
+#include <cstring>
+
+namespace qx::platform {
+
+const char *const hostModuleNames[2] = {"libqxrt.so", "libqxffrt.so"};
+
+namespace {
+
+pthread_mutex_t *AsMutex(void *section) { return static_cast<pthread_mutex_t *>(section); }
+
+iovec Piece(const char *text) { return {const_cast<char *>(text), std::strlen(text)}; }
+
+} // namespace
+
+Mutex::Mutex() : handle_(std::malloc(sizeof(pthread_mutex_t))) {
+    if (handle_ != nullptr)
+        pthread_mutex_init(AsMutex(handle_), nullptr);
+}
+Mutex::~Mutex() {
+    if (handle_ != nullptr)
+        pthread_mutex_destroy(AsMutex(handle_));
+    std::free(handle_);
+}
+void Mutex::lock() { CriticalSectionEnter(handle_); }
+void Mutex::unlock() { CriticalSectionLeave(handle_); }
+
+int32_t CriticalSectionSize() { return sizeof(pthread_mutex_t); }
+void CriticalSectionCreate(void *section) { pthread_mutex_init(AsMutex(section), nullptr); }
+void CriticalSectionDestroy(void *section) { pthread_mutex_destroy(AsMutex(section)); }
+void CriticalSectionEnter(void *section) { pthread_mutex_lock(AsMutex(section)); }
+void CriticalSectionLeave(void *section) { pthread_mutex_unlock(AsMutex(section)); }
+
+uintptr_t CurrentThread() { return static_cast<uintptr_t>(pthread_self()); }
+
+void *MainModule() { return dlopen(nullptr, RTLD_NOW | RTLD_NOLOAD); }
+
+void *LoadedModule(const char *name) { return dlopen(name, RTLD_NOW | RTLD_NOLOAD); }
+
+void *ModuleSymbol(void *module, const char *name) {
+    void *address = dlsym(module, name);
+    if (address == nullptr)
+        return nullptr;
+    // dlsym also looks through what the module depends on; only the module itself counts.
+    Dl_info found;
+    link_map *owner = nullptr;
+    link_map *asked = nullptr;
+    const bool known =
+        dladdr1(address, &found, reinterpret_cast<void **>(&owner), RTLD_DL_LINKMAP) != 0 &&
+        dlinfo(module, RTLD_DI_LINKMAP, &asked) == 0;
+    return known && owner == asked ? address : nullptr;
+}
+
+void FatalExit(const char *caption, const char *text) {
+    const iovec pieces[] = {Piece(caption), Piece(": "), Piece(text), Piece("\n")};
+    const ssize_t written = writev(STDERR_FILENO, pieces, 4);
+    static_cast<void>(written); // nobody is left to tell
+    _exit(1);
+}
+
+} // namespace qx::platform

@@ -1,0 +1,45 @@
+#include "frame/platform.h"
+
+#define WIN32_LEAN_AND_MEAN
+#include <windows.h>
+
+namespace qx::platform {
+
+const char *const hostModuleNames[2] = {"qxrt.dll", "qxffrt.dll"};
+
+namespace {
+
+CRITICAL_SECTION *AsSection(void *section) { return static_cast<CRITICAL_SECTION *>(section); }
+
+constexpr UINT stopIconTaskModal = 8208;
+static_assert(stopIconTaskModal == (MB_ICONHAND | MB_TASKMODAL));
+
+} // namespace
+
+Mutex::Mutex() : handle_(CreateMutexA(nullptr, FALSE, nullptr)) {}
+Mutex::~Mutex() { CloseHandle(handle_); }
+void Mutex::lock() { WaitForSingleObject(handle_, INFINITE); }
+void Mutex::unlock() { ReleaseMutex(handle_); }
+
+int32_t CriticalSectionSize() { return sizeof(CRITICAL_SECTION); }
+void CriticalSectionCreate(void *section) { InitializeCriticalSection(AsSection(section)); }
+void CriticalSectionDestroy(void *section) { DeleteCriticalSection(AsSection(section)); }
+void CriticalSectionEnter(void *section) { EnterCriticalSection(AsSection(section)); }
+void CriticalSectionLeave(void *section) { LeaveCriticalSection(AsSection(section)); }
+
+uintptr_t CurrentThread() { return GetCurrentThreadId(); }
+
+void *MainModule() { return GetModuleHandleA(nullptr); }
+
+void *LoadedModule(const char *name) { return GetModuleHandleA(name); }
+
+void *ModuleSymbol(void *module, const char *name) {
+    return reinterpret_cast<void *>(GetProcAddress(static_cast<HMODULE>(module), name));
+}
+
+void FatalExit(const char *caption, const char *text) {
+    MessageBoxA(nullptr, text, caption, stopIconTaskModal);
+    ExitProcess(1);
+}
+
+} // namespace qx::platform
