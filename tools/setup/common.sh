@@ -1,0 +1,82 @@
+# Shared by the set-up scripts; sourced, not run. Defines CACHE and:
+#   note TEXT...                a line of progress, on standard error
+#   fail TEXT...                says what is wrong and ends the script
+#   need_commands "PACKAGE..." COMMAND...   installs the packages where a command is missing
+#   debian_source PACKAGE       prints the folder of the unpacked Debian source package
+
+CACHE=${QX_CACHE:-${XDG_CACHE_HOME:-$HOME/.cache}/qxanalysis}
+mkdir -p "$CACHE"
+
+note() { echo "[$(basename "$0")] $*" >&2; }
+fail() {
+    note "$*"
+    exit 1
+}
+
+# One set-up script at a time works in the cache: two builds may be configured at once.
+lock_cache() {
+    exec 9>"$CACHE/$1.lock"
+    flock 9
+}
+
+need_commands() {
+    local packages=$1 command missing=
+    shift
+    for command in "$@"; do
+        command -v "$command" >/dev/null || missing="$missing $command"
+    done
+    [ -n "$missing" ] || return 0
+    [ "$(id -u)" = 0 ] || fail "missing:$missing. As root: apt-get install $packages"
+    note "installing $packages"
+    # shellcheck disable=SC2086
+    { DEBIAN_FRONTEND=noninteractive apt-get update -qq &&
+        DEBIAN_FRONTEND=noninteractive apt-get install -y --no-install-recommends $packages; } \
+        >"$CACHE/apt-install.log" 2>&1 || fail "apt-get install $packages failed: $CACHE/apt-install.log"
+}
+
+# The machine's own Debian sources as source-package lines, Signed-By included, in a folder of
+# their own: neither the machine's lists nor its sources are touched, and no root is needed.
+debian_source_lists() {
+    local folder=$1 list
+    mkdir -p "$folder/parts" "$folder/lists/partial" "$folder/cache"
+    for list in /etc/apt/sources.list /etc/apt/sources.list.d/*.list; do
+        [ -f "$list" ] && sed -En '/debian/s/^deb(-src)? /deb-src /p' "$list"
+    done | sort -u >"$folder/parts/debian.list"
+    : >"$folder/parts/debian.sources"
+    for list in /etc/apt/sources.list.d/*.sources; do
+        [ -f "$list" ] || continue
+        grep -v '^#' "$list" | awk 'BEGIN { RS = ""; ORS = "\n\n" } /URIs:[^\n]*debian/' |
+            sed 's/^Types:.*/Types: deb-src/' >>"$folder/parts/debian.sources"
+    done
+    if [ ! -s "$folder/parts/debian.list" ] && [ ! -s "$folder/parts/debian.sources" ]; then
+        echo "deb-src [signed-by=/usr/share/keyrings/debian-archive-keyring.gpg]" \
+            "http://deb.debian.org/debian bookworm main" >"$folder/parts/debian.list"
+    fi
+}
+
+debian_source() {
+    local package=$1 source="$CACHE/src/$1" apt work unpacked
+    if [ ! -f "$source/.complete" ]; then
+        need_commands "dpkg-dev" dpkg-source
+        note "fetching the source package $package"
+        apt="$CACHE/apt-source"
+        debian_source_lists "$apt"
+        local options=(-o Dir::Etc::sourcelist=/dev/null -o "Dir::Etc::sourceparts=$apt/parts"
+            -o "Dir::State::lists=$apt/lists" -o "Dir::Cache=$apt/cache"
+            -o APT::Sandbox::User= -o APT::Get::List-Cleanup=false -o Acquire::Languages=none
+            -o Acquire::Retries=3 -o DPkg::Lock::Timeout=60)
+        work=$(mktemp -d "$CACHE/src-XXXXXX")
+        (cd "$work" && apt-get "${options[@]}" update && apt-get "${options[@]}" source "$package") \
+            >"$CACHE/source-$package.log" 2>&1 ||
+            { rm -rf "$work"; fail "cannot fetch the source package $package: $CACHE/source-$package.log"; }
+        unpacked=$(find "$work" -mindepth 1 -maxdepth 1 -type d | head -n 1)
+        [ -n "$unpacked" ] || fail "the source package $package holds no folder"
+        dpkg-parsechangelog -l "$unpacked/debian/changelog" -S Version >"$unpacked/.version"
+        mkdir -p "$CACHE/src"
+        rm -rf "$source"
+        mv "$unpacked" "$source"
+        rm -rf "$work"
+        touch "$source/.complete"
+    fi
+    echo "$source"
+}
