@@ -16,6 +16,7 @@ endfunction()
 # A test program: links the core (inner routines), the module (exports) and the test support.
 function(qx_test name)
     add_executable(${name} ${ARGN})
+    set_target_properties(${name} PROPERTIES ENABLE_EXPORTS ON)
     target_link_libraries(${name} PRIVATE qxanalysis qxcore qxtestsupport GTest::gtest_main)
     add_test(NAME ${name} COMMAND ${name} --gtest_brief=1)
 endfunction()

@@ -1,6 +1,46 @@
 #include "frame/scratch.h"
+#include "frame/workspace.h"
+#include "tests/support/hostile_host.h"
 
 #include <gtest/gtest.h>
+
+#include <algorithm>
+#include <cstring>
+#include <limits>
+#include <random>
+#include <thread>
+#include <vector>
+
+namespace {
+
+using qx::AnalysisWorkspace;
+using qx::analysisWorkspace;
+
+constexpr int32_t overhead = 17; // of a scratch request in the region
+
+int32_t ModeOf(const void *block) {
+    int32_t mode;
+    std::memcpy(&mode, static_cast<const char *>(block) - 4, sizeof mode);
+    return mode;
+}
+
+int32_t TotalSizeOf(const void *block) {
+    int32_t size;
+    std::memcpy(&size, static_cast<const char *>(block) - 8, sizeof size);
+    return size;
+}
+
+// A region that is there and enabled while the scope lasts.
+class EnabledRegion {
+public:
+    explicit EnabledRegion(uint32_t size) {
+        EXPECT_EQ(analysisWorkspace.reserve(size), 0);
+        EXPECT_EQ(analysisWorkspace.setEnabled(true), 0);
+    }
+    ~EnabledRegion() { analysisWorkspace.sweep(); }
+};
+
+uint32_t Bump() { return analysisWorkspace.bump(); }
 
 TEST(Scratch, MergeFollowsTheRule) {
     EXPECT_EQ(qx::Merge(0, -20001), -20001);
@@ -9,3 +49,293 @@ TEST(Scratch, MergeFollowsTheRule) {
     EXPECT_EQ(qx::Merge(-20003, -20001), -20003);
     EXPECT_EQ(qx::Merge(0, 20001), 20001);
 }
+
+TEST(Scratch, SizesThatInt32CannotHoldAreRefused) {
+    constexpr int32_t most = std::numeric_limits<int32_t>::max();
+    void *block = &block;
+    for (int32_t size : {-1, std::numeric_limits<int32_t>::min(), most, most - 7}) {
+        EXPECT_EQ(qx::ScratchAlloc(&block, size), ErrOutOfMemory) << size;
+        EXPECT_EQ(block, nullptr);
+    }
+    qx::Scratch<qx::ElementType::CDB> complexes;
+    EXPECT_EQ(complexes.allocate(int64_t{1} << 40), ErrOutOfMemory);
+    EXPECT_EQ(complexes.allocate(most / 16 + 1), ErrOutOfMemory);
+    EXPECT_EQ(complexes.allocate(-1), ErrOutOfMemory);
+    EXPECT_EQ(qx::RawAlloc(-1, 32), nullptr);
+}
+
+// The first request of the process latches the default mode; before the attach that is the plain
+// heap. The owner lock took its memory then, so this program has seen mode 3 already.
+TEST(Scratch, BlocksGoBackToWhereTheyCameFrom) {
+    void *beforeAttach = qx::ScratchAllocPointer(10);
+    EXPECT_EQ(ModeOf(beforeAttach), 3);
+    qx::AttachScratchHeap();
+    void *fromHeap = qx::ScratchAllocPointer(10);
+    EXPECT_EQ(ModeOf(fromHeap), 1);
+    EXPECT_EQ(TotalSizeOf(fromHeap), 18);
+
+    void *fromRegion;
+    {
+        const EnabledRegion region(1000);
+        fromRegion = qx::ScratchAllocPointer(10);
+        EXPECT_EQ(ModeOf(fromRegion), 2);
+        EXPECT_EQ(analysisWorkspace.liveBlocks(), 1);
+        qx::ScratchFree(beforeAttach);
+        qx::ScratchFree(fromHeap);
+        EXPECT_EQ(analysisWorkspace.liveBlocks(), 1);
+
+        analysisWorkspace.setEnabled(false);
+        void *whileDisabled = qx::ScratchAllocPointer(10);
+        EXPECT_EQ(ModeOf(whileDisabled), 1);
+        qx::ScratchFree(fromRegion);
+        EXPECT_EQ(analysisWorkspace.liveBlocks(), 0);
+        qx::ScratchFree(whileDisabled);
+    }
+    EXPECT_EQ(qx::ScratchFree(nullptr), 0);
+}
+
+TEST(Workspace, CapacityIsExactToTheByte) {
+    for (const auto &[regionSize, request, fits] : {std::tuple{100, 82, true},
+                                                    {100, 83, false},
+                                                    {100, 84, false},
+                                                    {18, 0, true},
+                                                    {17, 0, false},
+                                                    {1, 0, false}}) {
+        const EnabledRegion region(static_cast<uint32_t>(regionSize));
+        void *block = qx::ScratchAllocPointer(request);
+        EXPECT_EQ(block != nullptr, fits) << regionSize << " " << request;
+        qx::ScratchFree(block);
+    }
+    // The same bound for a sequence: every block costs its size and the overhead.
+    const EnabledRegion region(3 * (100 + overhead) + 1);
+    std::vector<void *> blocks;
+    while (void *block = qx::ScratchAllocPointer(100))
+        blocks.push_back(block);
+    EXPECT_EQ(blocks.size(), 3U);
+    for (void *block : blocks)
+        qx::ScratchFree(block);
+}
+
+TEST(Workspace, ExhaustionLastsUntilTheLastLiveBlockGoes) {
+    const EnabledRegion region(200);
+    void *first = qx::ScratchAllocPointer(10);
+    void *second = qx::ScratchAllocPointer(10);
+    EXPECT_EQ(qx::ScratchAllocPointer(200), nullptr);
+    EXPECT_EQ(qx::ScratchAllocPointer(1), nullptr) << "full although bytes are left";
+    EXPECT_EQ(analysisWorkspace.liveBlocks(), 2) << "a refused request is not counted";
+    qx::ScratchFree(second);
+    EXPECT_EQ(qx::ScratchAllocPointer(1), nullptr);
+    qx::ScratchFree(first);
+    EXPECT_EQ(Bump(), 0U);
+    void *again = qx::ScratchAllocPointer(10);
+    EXPECT_EQ(again, first);
+    qx::ScratchFree(again);
+
+    void *payload = &payload;
+    EXPECT_EQ(analysisWorkspace.allocate(1000, &payload), ErrWorkspaceExhausted);
+    EXPECT_EQ(payload, nullptr);
+}
+
+TEST(Workspace, ReleasesInAnyOrderGiveEverythingBack) {
+    constexpr int count = 6;
+    std::vector<int> order(count);
+    for (int i = 0; i < count; ++i)
+        order[static_cast<std::size_t>(i)] = i;
+    do {
+        const EnabledRegion region(10000);
+        void *sentinel = qx::ScratchAllocPointer(5); // keeps the count above zero
+        const uint32_t start = Bump();
+        std::vector<void *> blocks;
+        for (int i = 0; i < count; ++i)
+            blocks.push_back(qx::ScratchAllocPointer(3 + i));
+        const uint32_t full = Bump();
+        std::vector<bool> released(count, false);
+        for (int i : order) {
+            qx::ScratchFree(blocks[static_cast<std::size_t>(i)]);
+            released[static_cast<std::size_t>(i)] = true;
+            // Bytes come back when the released blocks reach the end. A run is known only to
+            // the block right behind it at the time, so what lies between may stay longer.
+            const bool lastIsFree = released[count - 1];
+            EXPECT_EQ(Bump() < full, lastIsFree);
+            if (i == count - 1) {
+                uint32_t expected = start;
+                int run = count - 1;
+                while (run > 0 && released[static_cast<std::size_t>(run - 1)])
+                    --run;
+                for (int k = 0; k < run; ++k)
+                    expected += static_cast<uint32_t>(3 + k + overhead);
+                EXPECT_LE(Bump(), full);
+                EXPECT_GE(Bump(), expected);
+            }
+        }
+        qx::ScratchFree(sentinel);
+        EXPECT_EQ(Bump(), 0U);
+        EXPECT_EQ(analysisWorkspace.liveBlocks(), 0);
+    } while (std::next_permutation(order.begin(), order.end()));
+}
+
+TEST(Workspace, ForwardAndReverseReleasesFallBackOverTheWholeRun) {
+    const EnabledRegion region(1000);
+    void *keep = qx::ScratchAllocPointer(1);
+    const uint32_t start = Bump();
+    for (const bool reverse : {false, true}) {
+        void *blocks[4];
+        for (void *&block : blocks)
+            block = qx::ScratchAllocPointer(20);
+        if (reverse)
+            std::reverse(std::begin(blocks), std::end(blocks));
+        for (void *block : blocks)
+            qx::ScratchFree(block);
+        EXPECT_EQ(Bump(), start) << "reverse " << reverse;
+    }
+    qx::ScratchFree(keep);
+}
+
+TEST(Workspace, ResizeKeepsContentAndAStaleTotalSize) {
+    const auto fill = [](void *block, int32_t n) {
+        for (int32_t i = 0; i < n; ++i)
+            static_cast<unsigned char *>(block)[i] = static_cast<unsigned char>(i + 1);
+    };
+    const auto matches = [](const void *block, int32_t n) {
+        for (int32_t i = 0; i < n; ++i)
+            if (static_cast<const unsigned char *>(block)[i] != static_cast<unsigned char>(i + 1))
+                return false;
+        return true;
+    };
+
+    const EnabledRegion region(1000);
+    for (const bool inRegion : {false, true}) {
+        analysisWorkspace.setEnabled(inRegion);
+        void *block = nullptr;
+        ASSERT_EQ(qx::ScratchRealloc(&block, 40), 0);
+        fill(block, 40);
+        void *const first = block;
+        ASSERT_EQ(qx::ScratchRealloc(&block, 24), 0);
+        if (inRegion) {
+            EXPECT_EQ(block, first) << "a smaller block stays";
+        }
+        ASSERT_EQ(qx::ScratchRealloc(&block, 100), 0);
+        EXPECT_TRUE(matches(block, 24));
+        EXPECT_EQ(TotalSizeOf(block), 48) << "stays that of the first request";
+        fill(block, 100);
+
+        // A move to another source copies no more than the stale size says.
+        analysisWorkspace.setEnabled(!inRegion);
+        ASSERT_EQ(qx::ScratchRealloc(&block, 200), 0);
+        EXPECT_EQ(ModeOf(block), inRegion ? 1 : 2);
+        EXPECT_TRUE(matches(block, 40));
+        EXPECT_EQ(TotalSizeOf(block), 208);
+        ASSERT_EQ(qx::ScratchRealloc(&block, 0), 0);
+        EXPECT_EQ(block, nullptr);
+        EXPECT_EQ(analysisWorkspace.liveBlocks(), 0);
+    }
+
+    // A resize that the region cannot serve has lost the old block.
+    analysisWorkspace.setEnabled(true);
+    void *block = qx::ScratchAllocPointer(10);
+    EXPECT_EQ(qx::ScratchRealloc(&block, 2000), ErrOutOfMemory);
+    EXPECT_EQ(analysisWorkspace.liveBlocks(), 0);
+}
+
+TEST(Workspace, SweepEndsARunThatWasAborted) {
+    const int before = qx::test::RegisteredSweeps();
+    ASSERT_EQ(analysisWorkspace.reserve(1000), 0);
+    EXPECT_EQ(qx::test::RegisteredSweeps(), before + 1);
+    EXPECT_EQ(analysisWorkspace.reserve(5), ErrWorkspaceAlreadyInitialized);
+    analysisWorkspace.setEnabled(true);
+    void *leftBehind = qx::ScratchAllocPointer(10);
+    EXPECT_NE(leftBehind, nullptr);
+    EXPECT_EQ(analysisWorkspace.giveBack(), ErrWorkspaceStillInUse);
+    qx::test::RunSweeps();
+    EXPECT_EQ(analysisWorkspace.liveBlocks(), -1);
+    EXPECT_FALSE(analysisWorkspace.isEnabled());
+    EXPECT_EQ(qx::test::RegisteredSweeps(), before);
+    EXPECT_EQ(analysisWorkspace.giveBack(), 0);
+}
+
+// Threads allocate, release in random order and resize; every block is filled with a pattern of
+// its own, so an overlap of two live blocks or a lost byte shows.
+TEST(Workspace, ThreadsNeverShareAByte) {
+    constexpr int threads = 8;
+    constexpr int rounds = 60000;
+    const EnabledRegion region(1 << 24);
+    std::atomic<int> faults = 0;
+    std::atomic<int> refusals = 0;
+    const auto work = [&](int seed) {
+        std::mt19937 random(static_cast<unsigned>(seed));
+        struct Held {
+            unsigned char *bytes;
+            int32_t size;
+            unsigned char mark;
+        };
+        std::vector<Held> held;
+        const auto check = [&](const Held &h, int32_t size) {
+            for (int32_t i = 0; i < size; ++i)
+                if (h.bytes[i] != static_cast<unsigned char>(h.mark + i))
+                    ++faults;
+        };
+        const auto fill = [&](Held &h) {
+            h.mark = static_cast<unsigned char>(random());
+            for (int32_t i = 0; i < h.size; ++i)
+                h.bytes[i] = static_cast<unsigned char>(h.mark + i);
+        };
+        for (int round = 0; round < rounds; ++round) {
+            const auto act = random() % 8;
+            if (round % 64 == 63) { // an analysis ends: all goes, in one order or the other
+                if (act % 2 == 0)
+                    std::reverse(held.begin(), held.end());
+                for (const Held &h : held) {
+                    check(h, h.size);
+                    qx::ScratchFree(h.bytes);
+                }
+                held.clear();
+            }
+            if (held.size() < 12 && act < 4) {
+                Held h;
+                h.size = static_cast<int32_t>(random() % 90);
+                h.bytes = static_cast<unsigned char *>(qx::ScratchAllocPointer(h.size));
+                if (h.bytes == nullptr) {
+                    ++refusals;
+                    continue;
+                }
+                fill(h);
+                held.push_back(h);
+            } else if (!held.empty() && act < 7) {
+                const std::size_t which = act == 4 ? held.size() - 1 : random() % held.size();
+                check(held[which], held[which].size);
+                qx::ScratchFree(held[which].bytes);
+                held.erase(held.begin() + static_cast<std::ptrdiff_t>(which));
+            } else if (!held.empty()) {
+                Held &h = held[random() % held.size()];
+                const auto size = static_cast<int32_t>(1 + random() % 120);
+                void *block = h.bytes;
+                if (qx::ScratchRealloc(&block, size) != 0) {
+                    h = held.back();
+                    held.pop_back();
+                    ++refusals;
+                    continue;
+                }
+                h.bytes = static_cast<unsigned char *>(block);
+                check(h, std::min(h.size, size));
+                h.size = size;
+                fill(h);
+            }
+        }
+        for (const Held &h : held) {
+            check(h, h.size);
+            qx::ScratchFree(h.bytes);
+        }
+    };
+    std::vector<std::thread> pool;
+    for (int i = 0; i < threads; ++i)
+        pool.emplace_back(work, i + 1);
+    for (std::thread &thread : pool)
+        thread.join();
+    EXPECT_EQ(faults, 0);
+    EXPECT_EQ(Bump(), 0U);
+    EXPECT_EQ(analysisWorkspace.liveBlocks(), 0);
+    // A refusal is possible while dead runs lie between live blocks, but it must stay rare.
+    EXPECT_LT(refusals, threads * rounds / 100);
+}
+
+} // namespace

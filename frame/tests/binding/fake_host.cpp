@@ -1,0 +1,18 @@
+#include <cstdint>
+#include <cstdio>
+
+// A host of one function, which says where it was found. QX_FAKE_NAME tells which host this is;
+// QX_FAKE_MARK is the name by which a main program is known as a host.
+
+#define QX_FAKE_EXPORT extern "C" __attribute__((visibility("default")))
+
+#ifdef QX_FAKE_MARK
+QX_FAKE_EXPORT int32_t QX_FAKE_MARK() { return 0; }
+#endif
+
+#ifdef QX_FAKE_NAME
+QX_FAKE_EXPORT int32_t HostRegisterSweep(int32_t (*)(void *), void *, int32_t mode) {
+    std::printf("%s %d\n", QX_FAKE_NAME, mode);
+    return 0;
+}
+#endif

@@ -1,0 +1,94 @@
+#include "tests/support/heap_probe.h"
+
+#include <cerrno>
+#include <cstddef>
+
+#if defined(__linux__) && !defined(__SANITIZE_ADDRESS__) && !defined(__SANITIZE_THREAD__)
+#define QX_HEAP_PROBE 1
+#if defined(__has_feature)
+#if __has_feature(address_sanitizer) || __has_feature(thread_sanitizer)
+#undef QX_HEAP_PROBE
+#endif
+#endif
+#endif
+
+namespace qx::test {
+
+namespace {
+
+struct Watch {
+    bool on;
+    int32_t failAt;
+    int32_t allocations;
+    int32_t live;
+};
+// Of the initial-exec kind, so that reading it never allocates.
+__attribute__((tls_model("initial-exec"))) thread_local Watch watch;
+
+} // namespace
+
+HeapProbe::HeapProbe(int32_t failAt) { watch = {true, failAt, 0, 0}; }
+HeapProbe::~HeapProbe() { watch.on = false; }
+int32_t HeapProbe::allocations() const { return watch.allocations; }
+int32_t HeapProbe::liveAllocations() const { return watch.live; }
+HeapProbe::Pause::Pause() : wasWatching_(watch.on) { watch.on = false; }
+HeapProbe::Pause::~Pause() { watch.on = wasWatching_; }
+
+#ifdef QX_HEAP_PROBE
+
+bool HeapProbe::works() { return true; }
+
+namespace {
+
+bool Refuses() {
+    if (!watch.on)
+        return false;
+    if (++watch.allocations == watch.failAt) {
+        errno = ENOMEM;
+        return true;
+    }
+    return false;
+}
+
+void *Granted(void *block) {
+    if (watch.on && block != nullptr)
+        ++watch.live;
+    return block;
+}
+
+} // namespace
+
+#else
+bool HeapProbe::works() { return false; }
+#endif
+
+} // namespace qx::test
+
+#ifdef QX_HEAP_PROBE
+
+extern "C" {
+void *__libc_malloc(std::size_t);
+void *__libc_calloc(std::size_t, std::size_t);
+void *__libc_realloc(void *, std::size_t);
+void __libc_free(void *);
+
+__attribute__((visibility("default"))) void *malloc(std::size_t size) {
+    return qx::test::Refuses() ? nullptr : qx::test::Granted(__libc_malloc(size));
+}
+__attribute__((visibility("default"))) void *calloc(std::size_t count, std::size_t size) {
+    return qx::test::Refuses() ? nullptr : qx::test::Granted(__libc_calloc(count, size));
+}
+__attribute__((visibility("default"))) void *realloc(void *block, std::size_t size) {
+    if (qx::test::Refuses())
+        return nullptr;
+    void *grown = __libc_realloc(block, size);
+    return block == nullptr ? qx::test::Granted(grown) : grown;
+}
+__attribute__((visibility("default"))) void free(void *block) {
+    if (qx::test::watch.on && block != nullptr)
+        --qx::test::watch.live;
+    __libc_free(block);
+}
+}
+
+#endif

@@ -1,0 +1,38 @@
+#ifndef QX_TESTS_HEAP_PROBE_H
+#define QX_TESTS_HEAP_PROBE_H
+
+#include <cstdint>
+
+namespace qx::test {
+
+// Watches the heap calls of the calling thread, those of the module included, and can make one
+// of them fail. Works where malloc can be replaced: on Linux without sanitizers.
+class HeapProbe {
+public:
+    static bool works();
+
+    // Watches from construction to destruction; the n-th allocation fails (0 for none).
+    explicit HeapProbe(int32_t failAt = 0);
+    ~HeapProbe();
+    HeapProbe(const HeapProbe &) = delete;
+    HeapProbe &operator=(const HeapProbe &) = delete;
+
+    int32_t allocations() const;     // malloc, calloc and realloc, failed ones included
+    int32_t liveAllocations() const; // allocations less frees
+
+    // While one exists, heap calls are not watched: the host's own.
+    class Pause {
+    public:
+        Pause();
+        ~Pause();
+        Pause(const Pause &) = delete;
+        Pause &operator=(const Pause &) = delete;
+
+    private:
+        bool wasWatching_;
+    };
+};
+
+} // namespace qx::test
+
+#endif

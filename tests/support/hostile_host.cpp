@@ -1,0 +1,222 @@
+#include "tests/support/hostile_host.h"
+
+#include "frame/host_binding.h"
+#include "frame/platform.h"
+#include "tests/support/heap_probe.h"
+
+#include <cstdlib>
+#include <cstring>
+#include <deque>
+#include <map>
+#include <mutex>
+#include <stdexcept>
+
+namespace qx::test {
+
+namespace {
+
+constexpr std::size_t guardSize = 64;
+constexpr unsigned char guardByte = 0xFD;
+constexpr unsigned char freshByte = 0xA5; // as doubles about -1e-128, as int32 about -1.5e9
+constexpr unsigned char deadByte = 0xDE;
+constexpr std::size_t quarantineLimit = 64;
+
+struct Block {
+    unsigned char *memory; // guard, header and elements, guard
+    std::size_t size;      // header and elements
+    int32_t numDims;
+    unsigned char *payload() const { return memory + guardSize; }
+};
+
+struct Registry {
+    std::recursive_mutex lock;
+    std::map<void *, Block> live; // by handle
+    std::deque<Block> quarantine; // poisoned
+    std::map<std::pair<SweepProcedure, void *>, int32_t> sweeps;
+};
+
+Registry &Blocks() {
+    static auto *registry = new Registry;
+    return *registry;
+}
+
+Block Allocate(std::size_t size, int32_t numDims) {
+    // 16-byte alignment of the payload puts elements of a 1-D block at 4 modulo 16.
+    const std::size_t whole = (guardSize + size + guardSize + 15) / 16 * 16;
+    auto *memory = static_cast<unsigned char *>(std::malloc(whole + 16));
+    if (memory == nullptr)
+        throw std::bad_alloc();
+    std::memset(memory, guardByte, guardSize);
+    std::memset(memory + guardSize, freshByte, size);
+    std::memset(memory + guardSize + size, guardByte, guardSize);
+    return {memory, size, numDims};
+}
+
+void Expect(const unsigned char *bytes, std::size_t count, unsigned char value, const char *what) {
+    for (std::size_t i = 0; i < count; ++i)
+        if (bytes[i] != value)
+            throw std::logic_error(what);
+}
+
+void CheckGuards(const Block &block) {
+    Expect(block.memory, guardSize, guardByte, "a write before the start of a host block");
+    Expect(block.payload() + block.size, guardSize, guardByte,
+           "a write past the end of a host block");
+}
+
+void Quarantine(Registry &registry, Block block) {
+    CheckGuards(block);
+    std::memset(block.payload(), deadByte, block.size);
+    registry.quarantine.push_back(block);
+    if (registry.quarantine.size() > quarantineLimit) {
+        const Block oldest = registry.quarantine.front();
+        registry.quarantine.pop_front();
+        Expect(oldest.payload(), oldest.size, deadByte, "a write to a block that has moved");
+        std::free(oldest.memory);
+    }
+}
+
+std::size_t ElementSize(int32_t typeCode) {
+    switch (static_cast<ElementType>(typeCode)) {
+    case ElementType::U8:
+        return 1;
+    case ElementType::I32:
+    case ElementType::U32:
+    case ElementType::SGL:
+        return 4;
+    case ElementType::DBL:
+    case ElementType::CSG:
+        return 8;
+    case ElementType::CDB:
+        return 16;
+    }
+    throw std::logic_error("a reshape with an unknown type code");
+}
+
+constexpr int32_t statusNoMemory = 2;
+// More than any test needs, so that absurd requests are refused and not granted lazily.
+constexpr uint64_t largestBlock = uint64_t{1} << 30;
+
+} // namespace
+
+HostRecord &Host() {
+    thread_local HostRecord record;
+    return record;
+}
+
+void ResetHost(int32_t failAt, int32_t failStatus) { Host() = {{}, failAt, failStatus}; }
+
+void RunSweeps() {
+    Registry &registry = Blocks();
+    const auto registered = registry.sweeps;
+    for (const auto &[sweep, mode] : registered) {
+        if (mode == SweepForObject)
+            registry.sweeps.erase(sweep);
+        sweep.first(sweep.second);
+    }
+}
+
+int RegisteredSweeps() { return static_cast<int>(Blocks().sweeps.size()); }
+
+void CheckBlocks() {
+    const std::lock_guard hold(Blocks().lock);
+    for (const auto &[handle, block] : Blocks().live)
+        CheckGuards(block);
+    for (const Block &block : Blocks().quarantine)
+        Expect(block.payload(), block.size, deadByte, "a write to a block that has moved");
+}
+
+int LiveBlocks() {
+    const std::lock_guard hold(Blocks().lock);
+    return static_cast<int>(Blocks().live.size());
+}
+
+namespace detail {
+
+void *NewBlock(int32_t numDims, std::size_t elementSize, int32_t rows, int32_t cols) {
+    const HeapProbe::Pause pause;
+    const std::lock_guard hold(Blocks().lock);
+    const std::size_t count =
+        static_cast<std::size_t>(rows) * (numDims == 2 ? static_cast<std::size_t>(cols) : 1);
+    const Block block =
+        Allocate(4 * static_cast<std::size_t>(numDims) + count * elementSize, numDims);
+    const int32_t sizes[2] = {rows, cols};
+    std::memcpy(block.payload(), sizes, 4 * static_cast<std::size_t>(numDims));
+    auto *handle = new void *(block.payload());
+    Blocks().live.emplace(handle, block);
+    return handle;
+}
+
+void FreeBlock(void *handle) {
+    const HeapProbe::Pause pause;
+    const std::lock_guard hold(Blocks().lock);
+    Quarantine(Blocks(), Blocks().live.at(handle));
+    Blocks().live.erase(handle);
+    delete static_cast<void **>(handle);
+}
+
+int32_t ReshapeBlock(int32_t typeCode, int32_t numDims, void *handleAddress, int32_t count) {
+    const HeapProbe::Pause pause;
+    HostRecord &record = Host();
+    record.reshapes.push_back({typeCode, numDims, count});
+    if (record.failAt != 0 && static_cast<int32_t>(record.reshapes.size()) == record.failAt)
+        return record.failStatus;
+
+    const std::lock_guard hold(Blocks().lock);
+    void **handle = *static_cast<void ***>(handleAddress);
+    const auto found = Blocks().live.find(handle);
+    if (found == Blocks().live.end())
+        throw std::logic_error("a reshape of something that is no handle");
+    if (numDims != found->second.numDims)
+        throw std::logic_error("a reshape with another number of dimensions");
+    if (count < 0)
+        throw std::logic_error("a reshape to a negative count");
+    const uint64_t size =
+        4 * static_cast<uint64_t>(numDims) + static_cast<uint64_t>(count) * ElementSize(typeCode);
+    if (size > largestBlock)
+        return statusNoMemory;
+
+    const Block old = found->second;
+    const Block moved = Allocate(static_cast<std::size_t>(size), numDims);
+    std::memcpy(moved.payload(), old.payload(), old.size < moved.size ? old.size : moved.size);
+    Quarantine(Blocks(), old);
+    found->second = moved;
+    *handle = moved.payload();
+    return 0;
+}
+
+int32_t RegisterSweep(SweepProcedure procedure, void *argument, int32_t mode) {
+    const HeapProbe::Pause pause;
+    const std::lock_guard hold(Blocks().lock);
+    if (mode == SweepWithdraw)
+        Blocks().sweeps.erase({procedure, argument});
+    else
+        Blocks().sweeps[{procedure, argument}] = mode;
+    return 0;
+}
+
+} // namespace detail
+
+} // namespace qx::test
+
+// What the module looks for in the main program.
+#ifdef _WIN32
+#define QX_TEST_EXPORT __declspec(dllexport)
+#else
+#define QX_TEST_EXPORT __attribute__((visibility("default")))
+#endif
+
+extern "C" {
+extern QX_TEST_EXPORT int32_t gQXRTVersion;
+int32_t gQXRTVersion = 1;
+
+QX_TEST_EXPORT int32_t HostBlockReshape(int32_t typeCode, int32_t numDims, void *handleAddress,
+                                        int32_t count) {
+    return qx::test::detail::ReshapeBlock(typeCode, numDims, handleAddress, count);
+}
+
+QX_TEST_EXPORT int32_t HostRegisterSweep(qx::SweepProcedure procedure, void *argument,
+                                         int32_t mode) {
+    return qx::test::detail::RegisterSweep(procedure, argument, mode);
+}
+}

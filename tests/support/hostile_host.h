@@ -1,0 +1,129 @@
+#ifndef QX_TESTS_HOSTILE_HOST_H
+#define QX_TESTS_HOSTILE_HOST_H
+
+#include "frame/elements.h"
+#include "qx/errors.h"
+
+#include <cstdint>
+#include <initializer_list>
+#include <utility>
+#include <vector>
+
+// A host that a careless frame does not survive. It is part of the test program, which exports
+// the names that the module looks for. Every successful reshape moves the block, poisons the old
+// one and keeps it for a while to see whether anybody still writes there; both ends of every
+// block are guarded; elements of 1-D blocks stand at 4 modulo 16; new bytes hold a pattern that
+// no result looks like.
+
+namespace qx::test {
+
+struct Reshape {
+    int32_t typeCode;
+    int32_t numDims;
+    int32_t count;
+    bool operator==(const Reshape &) const = default;
+};
+
+// The reshapes and failures of the calling thread; several threads do not disturb each other.
+struct HostRecord {
+    std::vector<Reshape> reshapes; // in order, refused ones included
+    int32_t failAt = 0;            // the n-th reshape from the last reset fails; 0 for none
+    int32_t failStatus = 0;        // with this status
+};
+HostRecord &Host();
+// Forgets the calling thread's record and sets which reshape fails.
+void ResetHost(int32_t failAt = 0, int32_t failStatus = 0);
+
+// Calls every registered sweep, as the host does after an aborted run. An object's sweep is
+// forgotten with the call.
+void RunSweeps();
+int RegisteredSweeps();
+
+// Throws if a guard or a poisoned byte has changed since; called by every reshape and free too.
+void CheckBlocks();
+int LiveBlocks();
+
+namespace detail {
+// The type of an element without its alignment of one byte: template arguments drop that.
+template <class T>
+struct Aligned {
+    using type = T;
+};
+void *NewBlock(int32_t numDims, std::size_t elementSize, int32_t rows, int32_t cols);
+void FreeBlock(void *handle);
+int32_t ReshapeBlock(int32_t typeCode, int32_t numDims, void *handleAddress, int32_t count);
+int32_t RegisterSweep(int32_t (*procedure)(void *), void *argument, int32_t mode);
+} // namespace detail
+
+// Test arrays: blocks of the hostile host under their C++ content.
+template <ElementType Code>
+class Array1D {
+public:
+    typedef typename Element<Code>::type T;
+    typedef typename detail::Aligned<T>::type Value;
+
+    explicit Array1D(int32_t n = 0)
+        : handle_(static_cast<Array1DHandle>(detail::NewBlock(1, sizeof(T), n, 0))) {}
+    Array1D(std::initializer_list<Value> values) : Array1D(static_cast<int32_t>(values.size())) {
+        assign(values);
+    }
+    template <class Range, class = decltype(std::declval<const Range &>().begin())>
+    explicit Array1D(const Range &values) : Array1D(static_cast<int32_t>(values.size())) {
+        assign(values);
+    }
+    ~Array1D() { detail::FreeBlock(handle_); }
+    Array1D(const Array1D &) = delete;
+    Array1D &operator=(const Array1D &) = delete;
+
+    Array1DHandle handle() const { return handle_; }
+    int32_t size() const { return (*handle_)->dimSize; }
+    T *data() const { return reinterpret_cast<T *>(*handle_ + 1); }
+    // By value: a reference would bind to an address without the alignment of its type.
+    Value operator[](std::ptrdiff_t i) const { return data()[i]; }
+    std::vector<Value> values() const { return std::vector<Value>(data(), data() + size()); }
+
+private:
+    template <class Range>
+    void assign(const Range &values) {
+        T *next = data();
+        for (const Value &value : values)
+            *next++ = value;
+    }
+    Array1DHandle handle_;
+};
+
+template <ElementType Code>
+class Array2D {
+public:
+    typedef typename Element<Code>::type T;
+    typedef typename detail::Aligned<T>::type Value;
+
+    Array2D(int32_t rows = 0, int32_t cols = 0)
+        : handle_(static_cast<Array2DHandle>(detail::NewBlock(2, sizeof(T), rows, cols))) {}
+    ~Array2D() { detail::FreeBlock(handle_); }
+    Array2D(const Array2D &) = delete;
+    Array2D &operator=(const Array2D &) = delete;
+
+    Array2DHandle handle() const { return handle_; }
+    int32_t rows() const { return (*handle_)->dimSizes[0]; }
+    int32_t cols() const { return (*handle_)->dimSizes[1]; }
+    int32_t size() const { return rows() * cols(); }
+    T *data() const { return reinterpret_cast<T *>(*handle_ + 1); }
+    Value at(int32_t row, int32_t col) const { return data()[std::ptrdiff_t{row} * cols() + col]; }
+    // By value: a reference would bind to an address without the alignment of its type.
+    Value operator[](std::ptrdiff_t i) const { return data()[i]; }
+    std::vector<Value> values() const { return std::vector<Value>(data(), data() + size()); }
+
+private:
+    Array2DHandle handle_;
+};
+
+using DBLArray = Array1D<ElementType::DBL>;
+using CDBArray = Array1D<ElementType::CDB>;
+using I32Array = Array1D<ElementType::I32>;
+using DBLMatrix = Array2D<ElementType::DBL>;
+using CDBMatrix = Array2D<ElementType::CDB>;
+
+} // namespace qx::test
+
+#endif
