@@ -80,3 +80,11 @@ debian_source() {
     fi
     echo "$source"
 }
+
+# The mirror that the machine itself installs from.
+debian_mirror() {
+    local mirror
+    mirror=$(apt-get indextargets --format '$(SITE) $(RELEASE)' 'Created-By: Packages' 2>/dev/null |
+        awk '$2 == "bookworm" || $2 == "stable" { print $1; exit }')
+    echo "${mirror:-http://deb.debian.org/debian}"
+}
