@@ -1,0 +1,155 @@
+"""The reader of the public headers: what it makes of good ones and where it refuses bad ones."""
+
+import json
+import subprocess
+import sys
+import tempfile
+import unittest
+from pathlib import Path
+
+ROOT = Path(__file__).resolve().parent.parent
+sys.path.insert(0, str(ROOT / "tools"))
+import catalogue  # noqa: E402
+
+SHAPES = """#ifndef GUARD
+#define GUARD
+#include "qx/types.h" /* QX_API in a comment is none */
+QX_BEGIN_DECLS
+/** A pair. */
+typedef struct Interval {
+    double lower, upper;
+    int32_t closure;
+    Array1DHandle edges;
+    int32_t spare[2];
+} Interval;
+typedef Array1DHandle Interval1D;
+typedef struct Plan Plan;
+typedef void *PlanSlot;
+typedef void *InstanceWord;
+typedef double (*Function)(double x, void *context);
+
+/** One line; ErrEmptyInput, then -20001, then ErrEmptyInput. */
+QX_API ErrorCode Everything(QX_IN DBL1D x, QX_INOUT CDB2D m, QX_IN Interval1D intervals,
+                            QX_OUT I32_1D counts, int32_t n, QX_IN const int32_t *order,
+                            QX_OUT DBL *value, QX_INOUT DBL *level, QX_INOUT PlanSlot *slot,
+                            QX_INOUT InstanceWord *instance, QX_INOUT Interval *record,
+                            Function function, QX_OUT ErrorCode *err);
+/**
+ * Stars in the margin
+ *   and an indented line.
+ */
+QX_API Plan *
+make_plan(int32_t n);
+
+/** A second comment counts, not the first. */
+/** No arguments. */
+QX_API void forget(void);
+
+QX_END_DECLS
+#endif
+"""
+
+
+def tree(folder, **headers):
+    """A folder of public headers: the project's own types.h and errors.h beside the given ones."""
+    target = Path(folder) / "qx"
+    target.mkdir()
+    for name in ("types.h", "errors.h"):
+        (target / name).write_text((ROOT / "include/qx" / name).read_text())
+    for name, text in headers.items():
+        (target / f"{name}.h").write_text(text)
+    return folder
+
+
+class Reading(unittest.TestCase):
+    def test_every_kind_of_argument(self):
+        with tempfile.TemporaryDirectory() as folder:
+            result = catalogue.read_headers(tree(folder, shapes=SHAPES))
+        everything, make, forget = result["exports"]
+        self.assertEqual([(a["name"], a["kind"], a.get("element"), a["direction"])
+                          for a in everything["arguments"]], [
+            ("x", "array1d", "DBL", "in"), ("m", "array2d", "CDB", "inout"),
+            ("intervals", "array1d", "Interval", "in"), ("counts", "array1d", "I32", "out"),
+            ("n", "value", "I32", "in"), ("order", "reference", "I32", "in"),
+            ("value", "output", "DBL", "out"), ("level", "inout", "DBL", "inout"),
+            ("slot", "slot", None, "inout"), ("instance", "instance", None, "inout"),
+            ("record", "record", "Interval", "inout"), ("function", "procedure", None, "in"),
+            ("err", "error", "I32", "out")])
+        self.assertEqual(everything["codes"], ["ErrEmptyInput", "ErrOutOfMemory"])
+        self.assertEqual((everything["family"], everything["returns"]), ("shapes", "ErrorCode"))
+        self.assertEqual(everything["line"], SHAPES[:SHAPES.index("QX_API ErrorCode")].count("\n") + 1)
+        self.assertEqual((make["returns"], make["documentation"]),
+                         ("Plan *", "Stars in the margin\n  and an indented line."))
+        self.assertEqual((forget["arguments"], forget["documentation"]), ([], "No arguments."))
+        self.assertEqual([f["name"] for f in result["records"]["Interval"]["fields"]],
+                         ["lower", "upper", "closure", "edges", "spare"])
+        self.assertTrue(result["records"]["WorkspaceStatus"]["packed"])
+        self.assertEqual(result["codes"]["ErrOutOfMemory"], -20001)
+
+    def test_files_written(self):
+        with tempfile.TemporaryDirectory() as folder:
+            tree(folder, shapes=SHAPES)
+            out = Path(folder) / "made"
+            command = [sys.executable, str(ROOT / "tools/catalogue.py"), folder, "--json",
+                       str(out / "c.json"), "--map", str(out / "c.map"), "--def", str(out / "c.def")]
+            subprocess.run(command, check=True)
+            self.assertEqual(len(json.loads((out / "c.json").read_text())["exports"]), 3)
+            self.assertEqual((out / "c.map").read_text().split(),
+                             "{ global: Everything; make_plan; forget; local: *; };".split())
+            self.assertEqual((out / "c.def").read_text().split(),
+                             "EXPORTS Everything make_plan forget".split())
+            before = (out / "c.map").stat().st_mtime_ns
+            subprocess.run(command, check=True)
+            self.assertEqual((out / "c.map").stat().st_mtime_ns, before, "an unchanged file was touched")
+
+
+class Refusing(unittest.TestCase):
+    BAD = {
+        "no documentation": "\nQX_API void f(void);",
+        "documentation is empty": "\n/** */ QX_API void f(void);",
+        "declared before": "/** A. */ QX_API void f(void);\n/** A. */ QX_API void f(void);",
+        "names its element": "\n/** A. */ QX_API void f(QX_IN Array1DHandle x);",
+        "QX_IN, QX_OUT or QX_INOUT is missing": "\n/** A. */ QX_API void f(DBL1D x);",
+        "is an input": "\n/** A. */ QX_API void f(QX_OUT double x);",
+        "const exactly": "\n/** A. */ QX_API void f(QX_IN DBL *x);",
+        "const exactly if": "\n/** A. */ QX_API void f(QX_OUT const DBL *x);",
+        "must be the last": "\n/** A. */ QX_API void f(QX_OUT ErrorCode *err, int32_t n);",
+        "unknown type long": "\n/** A. */ QX_API void f(long n);",
+        "unknown result type": "\n/** A. */ QX_API long f(int32_t n);",
+        "a type and a name": "\n/** A. */ QX_API void f(int32_t);",
+        "two arguments are called n": "\n/** A. */ QX_API void f(int32_t n, double n);",
+        "does not have": "\n/** Codes: ErrNoSuchThing. */ QX_API void f(void);",
+        "names -20009": "\n/** Codes: -20009. */ QX_API void f(void);",
+        "must begin": "\n/** A. */ extern QX_API void f(void);",
+        "not marked QX_API": "\n/** A. */ void f(void);",
+        "does not end": "\n/** A. */ QX_API void f(void)",
+        "cannot be read": "\n/** A. */ QX_API void (*f)(void)[2];",
+        "a known element or record": "\ntypedef Array1DHandle Thing1D;",
+    }
+
+    def test_bad_headers_are_named_with_file_and_line(self):
+        for reason, text in self.BAD.items():
+            with self.subTest(reason), tempfile.TemporaryDirectory() as folder:
+                with self.assertRaises(catalogue.HeaderError) as caught:
+                    catalogue.read_headers(tree(folder, bad=text))
+                self.assertIn(reason, str(caught.exception))
+                self.assertRegex(str(caught.exception), r"bad\.h:2: ")
+
+    def test_header_that_the_umbrella_forgets(self):
+        with tempfile.TemporaryDirectory() as folder:
+            tree(folder, shapes=SHAPES, qx='#include "qx/other.h"\n')
+            with self.assertRaisesRegex(catalogue.HeaderError, "qx.h does not include"):
+                catalogue.read_headers(folder)
+
+    def test_the_command_fails(self):
+        with tempfile.TemporaryDirectory() as folder:
+            tree(folder, bad=self.BAD["no documentation"])
+            ran = subprocess.run([sys.executable, str(ROOT / "tools/catalogue.py"), folder, "--json",
+                                  f"{folder}/c.json"], capture_output=True, text=True)
+            self.assertEqual(ran.returncode, 1)
+            self.assertIn("bad.h:2", ran.stderr)
+            self.assertFalse((Path(folder) / "c.json").exists())
+
+
+if __name__ == "__main__":
+    unittest.main()

@@ -1,0 +1,379 @@
+#!/usr/bin/python3
+"""Reads the public headers and writes the catalogue of the exports.
+
+    catalogue.py INCLUDE_DIR --json FILE      names, arguments, documentation
+    catalogue.py INCLUDE_DIR --map FILE       linker version script of exactly the exports
+    catalogue.py INCLUDE_DIR --def FILE       module definition file of exactly the exports
+
+The headers are the one place where an export is declared. A declaration that cannot be read, an
+export without documentation, a name declared twice and an unknown error code in the documentation
+end the run with file, line and reason, and so fail the build.
+"""
+
+import argparse
+import json
+import re
+import sys
+from pathlib import Path
+
+NOT_A_FAMILY = {"types.h", "errors.h", "host.h", "qx.h"}
+
+# C type of a scalar -> element name.
+SCALARS = {
+    "int32_t": "I32", "I32": "I32", "ErrorCode": "I32", "uint8_t": "U8", "U8": "U8",
+    "uint32_t": "U32", "U32": "U32", "float": "SGL", "SGL": "SGL", "double": "DBL", "DBL": "DBL",
+    "CSG": "CSG", "CDB": "CDB",
+}
+DIRECTIONS = {"QX_IN": "in", "QX_OUT": "out", "QX_INOUT": "inout"}
+HANDLE_DIMENSIONS = {"Array1DHandle": 1, "Array2DHandle": 2}
+
+TOKEN = re.compile(
+    r"(?P<comment>/\*.*?\*/|//[^\n]*)|(?P<directive>^[ \t]*\#(?:\\\n|[^\n])*)"
+    r"|(?P<word>[A-Za-z_]\w*)|(?P<number>\d\w*)|(?P<string>\"[^\"\n]*\")|(?P<mark>\.\.\.|[^\s\w])",
+    re.DOTALL | re.MULTILINE)
+
+
+class HeaderError(Exception):
+    def __init__(self, path, line, reason):
+        super().__init__(f"{path}:{line}: {reason}")
+
+
+class Token:
+    def __init__(self, text, line):
+        self.text, self.line = text, line
+
+
+class Statement:
+    """The tokens of one declaration up to its semicolon, and the comment right before it."""
+
+    def __init__(self, tokens, comment):
+        self.tokens, self.comment = tokens, comment
+        self.words = [token.text for token in tokens]
+        self.line = tokens[0].line
+
+
+def tokens_of(text):
+    position, line = 0, 1
+    for match in TOKEN.finditer(text):
+        line += text.count("\n", position, match.start())
+        position = match.start()
+        if match.lastgroup != "directive":
+            yield Token(match.group(), line)
+
+
+def statements_of(path, text):
+    tokens, comment, depth = [], None, 0
+    for token in tokens_of(text):
+        if token.text.startswith(("/*", "//")):
+            if not tokens:
+                comment = token
+            continue
+        if not tokens and token.text in ("QX_BEGIN_DECLS", "QX_END_DECLS"):
+            comment = None
+            continue
+        depth += (token.text in "({[") - (token.text in ")}]")
+        if token.text == ";" and depth == 0:
+            if tokens:
+                yield Statement(tokens, comment)
+            tokens, comment = [], None
+        else:
+            tokens.append(token)
+    if tokens:
+        raise HeaderError(path, tokens[0].line, "a declaration that does not end")
+
+
+def split(words, separator=","):
+    """Splits at the separators that stand outside brackets."""
+    parts, depth = [[]], 0
+    for word in words:
+        depth += (word in ("(", "{", "[")) - (word in (")", "}", "]"))
+        if word == separator and depth == 0:
+            parts.append([])
+        else:
+            parts[-1].append(word)
+    return parts
+
+
+def without_attributes(words):
+    words = list(words)
+    while "__attribute__" in words:
+        start = words.index("__attribute__")
+        end, depth = start + 1, 0
+        while True:
+            depth += (words[end] == "(") - (words[end] == ")")
+            end += 1
+            if depth == 0:
+                break
+        del words[start:end]
+    return words
+
+
+def spelled(words):
+    return re.sub(r" ?\* ?", " *", " ".join(words)).replace("* *", "**").strip()
+
+
+class Types:
+    """What the headers say about their own types."""
+
+    def __init__(self):
+        self.records = {}  # name -> {"packed": bool, "fields": [...]}
+        self.handles = {}  # name -> (dimensions, element)
+        self.opaque = set()  # pointers, or structs behind pointers, that the caller only keeps
+        self.procedures = set()
+
+    def read(self, path, statement):
+        words = statement.words
+        if "{" in words and words[1:2] != ["enum"]:
+            self._record(path, statement)
+        elif "(" in without_attributes(words):
+            match = re.search(r"\( \* (\w+) \)", " ".join(words))
+            if not match:
+                raise HeaderError(path, statement.line, "a typedef that cannot be read")
+            self.procedures.add(match.group(1))
+        elif words[1] in HANDLE_DIMENSIONS:
+            for part in split(words[2:]):
+                self._handle(path, statement.line, words[1], part)
+        elif words[1:3] == ["void", "*"] or (words[1] == "struct" and len(words) == 4):
+            self.opaque.add(words[3])
+
+    def _handle(self, path, line, base, part):
+        dimensions = HANDLE_DIMENSIONS[base]
+        match = re.fullmatch(rf"(\w+?)_?{dimensions}D", part[0]) if len(part) == 1 else None
+        element = match.group(1) if match else None
+        if element not in SCALARS and element not in self.records:
+            raise HeaderError(path, line, f"handle type {' '.join(part)}: its name must be a known"
+                              f" element or record and {dimensions}D")
+        self.handles[part[0]] = (dimensions, element)
+
+    def _record(self, path, statement):
+        words = statement.words
+        plain = without_attributes(words)
+        opening = plain.index("{")
+        closing = len(plain) - 1 - plain[::-1].index("}")
+        names = plain[closing + 1:]
+        if plain[1] != "struct" or len(names) != 1:
+            raise HeaderError(path, statement.line, "a record that cannot be read")
+        fields = []
+        for declaration in split(plain[opening + 1:closing], ";"):
+            if declaration:
+                fields += self._fields(path, statement.line, declaration)
+        self.records[names[0]] = {"packed": "packed" in words, "fields": fields}
+
+    def _fields(self, path, line, declaration):
+        declaration = [word for word in declaration if word not in ("const", "struct")]
+        base = declaration[0]
+        fields = []
+        for part in split(declaration[1:]):
+            match = re.fullmatch(r"(\**)(\w+)(?:\[(\w+)\])?", "".join(part))
+            if not match:
+                raise HeaderError(path, line, f"a field that cannot be read: {spelled(part)}")
+            stars, name, count = match.groups()
+            field = {"name": name, "type": base + (" " + stars if stars else "")}
+            if not stars and base in SCALARS:
+                field["element"] = SCALARS[base]
+            if count:
+                field["count"] = count
+            fields.append(field)
+        return fields
+
+
+def documentation_of(comment):
+    lines = comment.text[3:-2].split("\n")
+    lines = [lines[0].strip()] + [re.sub(r"^\s*\* ?", "", line).rstrip() for line in lines[1:]]
+    margins = [len(line) - len(line.lstrip()) for line in lines[1:] if line.strip()]
+    margin = min(margins, default=0)
+    return "\n".join([lines[0]] + [line[margin:] for line in lines[1:]]).strip()
+
+
+def argument_of(words, types):
+    """One argument as a dictionary; a ValueError says why it cannot be read."""
+    text = spelled(words)
+    direction = DIRECTIONS.get(words[0])
+    words = words[1:] if direction else words
+    if any(word in DIRECTIONS for word in words):
+        raise ValueError(f"argument '{text}': a direction mark stands first and once")
+    if len(words) < 2 or not re.fullmatch(r"[A-Za-z_]\w*", words[-1]):
+        raise ValueError(f"argument '{text}': a type and a name are needed")
+    name, kind_words = words[-1], words[:-1]
+    constant = "const" in kind_words
+    base = [word for word in kind_words if word not in ("const", "struct")]
+    stars = base.count("*")
+    base = [word for word in base if word != "*"]
+    if len(base) != 1:
+        raise ValueError(f"argument '{text}': its type cannot be read")
+    base = base[0]
+    argument = {"name": name, "type": spelled(kind_words), "direction": direction or "in"}
+
+    if base in HANDLE_DIMENSIONS:
+        raise ValueError(f"argument '{text}': a handle type that names its element is needed")
+    if base in types.handles and stars == 0:
+        dimensions, argument["element"] = types.handles[base]
+        argument["kind"] = f"array{dimensions}d"
+    elif stars == 0 and base in SCALARS:
+        if direction not in (None, "in"):
+            raise ValueError(f"argument '{text}': a scalar by value is an input")
+        argument.update(kind="value", element=SCALARS[base])
+        return argument
+    elif stars == 0 and base in types.procedures:
+        argument["kind"] = "procedure"
+        return argument
+    elif stars == 1 and base in types.opaque and re.search(r"Slot$|InstanceWord$", base):
+        argument["kind"] = "instance" if base.endswith("InstanceWord") else "slot"
+        if direction != "inout":
+            raise ValueError(f"argument '{text}': the caller's word must be QX_INOUT")
+    elif (stars == 1 and (base in types.opaque or base == "void")) or (
+            stars == 0 and base in types.opaque):
+        argument["kind"] = "opaque"
+    elif stars == 1 and base == "ErrorCode":
+        argument.update(kind="error", element="I32")
+        if direction != "out":
+            raise ValueError(f"argument '{text}': an error out-parameter must be QX_OUT")
+    elif stars == 1 and base in SCALARS:
+        argument["kind"] = {"in": "reference", "out": "output", "inout": "inout"}.get(direction)
+        argument["element"] = SCALARS[base]
+    elif stars == 1 and base in types.records:
+        argument.update(kind="record", element=base)
+    else:
+        raise ValueError(f"argument '{text}': unknown type {spelled(kind_words)}")
+    if direction is None:
+        raise ValueError(f"argument '{text}': QX_IN, QX_OUT or QX_INOUT is missing")
+    if argument["kind"] in ("reference", "output", "inout", "record"):
+        if constant != (direction == "in"):
+            raise ValueError(f"argument '{text}': a pointer is const exactly if it is QX_IN")
+    return argument
+
+
+def raised_codes(documentation, codes):
+    """The codes that a text names, by name or by signed number, in order; and an unknown one."""
+    names = {number: name for name, number in codes.items()}
+    raised = []
+    for word in re.findall(r"\b(?:Err|Warn)[A-Z]\w*|(?<![\w.])[-+]2[0-4]\d{3}(?!\w|\.\d)", documentation):
+        code = names.get(int(word)) if word[0] in "+-" else word
+        if code == "ErrorCode":
+            continue
+        if code not in codes:
+            return raised, word
+        raised.append(code)
+    return list(dict.fromkeys(raised)), None
+
+
+def export_of(path, statement, types, codes):
+    def fail(reason):
+        raise HeaderError(path, statement.line, reason)
+
+    words = statement.words[1:]
+    if "(" not in words or words[-1] != ")":
+        fail(f"an export that cannot be read: {spelled(words)}")
+    opening = words.index("(")
+    name = words[opening - 1] if opening > 1 else ""
+    returns = words[:opening - 1]
+    if not re.fullmatch(r"[A-Za-z_]\w*", name):
+        fail(f"an export that cannot be read: {spelled(words)}")
+    if statement.comment is None or not re.match(r"/\*\*[^/]", statement.comment.text):
+        fail(f"{name}: no documentation comment /** ... */ right before it")
+    documentation = documentation_of(statement.comment)
+    if not documentation:
+        fail(f"{name}: its documentation is empty")
+    known = set(SCALARS) | types.opaque | {"void"}
+    if not returns or not {word for word in returns if word != "*"} <= known:
+        fail(f"{name}: unknown result type {spelled(returns)}")
+    raised, unknown = raised_codes(documentation, codes)
+    if unknown:
+        fail(f"{name}: the documentation names {unknown}, which errors.h does not have")
+
+    arguments = []
+    parts = split(words[opening + 1:-1])
+    for part in [] if parts in ([[]], [["void"]]) else parts:
+        try:
+            arguments.append(argument_of(part, types))
+        except ValueError as error:
+            fail(f"{name}: {error}")
+        if [a["name"] for a in arguments].count(arguments[-1]["name"]) > 1:
+            fail(f"{name}: two arguments are called {arguments[-1]['name']}")
+    if any(a["kind"] == "error" for a in arguments[:-1]):
+        fail(f"{name}: an error out-parameter must be the last argument")
+    return {
+        "name": name, "family": path.stem, "header": f"qx/{path.name}", "line": statement.line,
+        "returns": spelled(returns), "declaration": spelled(words).replace(" ,", ",")
+        .replace("( ", "(").replace(" (", "(").replace(" )", ")"),
+        "arguments": arguments, "codes": raised,
+        "documentation": documentation,
+    }
+
+
+def codes_of(path):
+    pairs = re.findall(r"\b((?:Err|Warn)\w+|QXSuccess)\s*=\s*(-?\d+)", path.read_text("utf-8"))
+    return {name: int(number) for name, number in pairs}
+
+
+def read_headers(include):
+    """The whole catalogue; `include` is the folder that holds qx/."""
+    folder = Path(include) / "qx"
+    codes = codes_of(folder / "errors.h")
+    types, exports, seen = Types(), [], {}
+    umbrella = (folder / "qx.h").read_text("utf-8") if (folder / "qx.h").exists() else None
+    families = sorted(p for p in folder.glob("*.h") if p.name not in NOT_A_FAMILY)
+    parsed = [(path, list(statements_of(path, path.read_text("utf-8"))))
+              for path in [folder / "types.h", *families]]
+    for path, statements in parsed:
+        for statement in statements:
+            if statement.words[0] == "typedef":
+                types.read(path, statement)
+    for path, statements in parsed[1:]:
+        if umbrella is not None and f'"qx/{path.name}"' not in umbrella:
+            raise HeaderError(path, 1, "qx.h does not include this header")
+        for statement in statements:
+            if statement.words[0] == "QX_API":
+                export = export_of(path, statement, types, codes)
+                name, place = export["name"], f"{path}:{statement.line}"
+                if name in seen:
+                    raise HeaderError(path, statement.line, f"{name} is declared before, {seen[name]}")
+                seen[name] = place
+                exports.append(export)
+            elif "QX_API" in statement.words:
+                raise HeaderError(path, statement.line, "QX_API must begin the declaration")
+            elif "(" in statement.words and statement.words[0] not in ("typedef", "enum"):
+                raise HeaderError(path, statement.line, "a function that is not marked QX_API")
+    return {"codes": codes, "records": types.records, "exports": exports}
+
+
+def version_script(catalogue):
+    names = "".join(f"    {export['name']};\n" for export in catalogue["exports"])
+    return "{\n" + (f"  global:\n{names}" if names else "") + "  local:\n    *;\n};\n"
+
+
+def definition_file(catalogue):
+    return "EXPORTS\n" + "".join(f"    {export['name']}\n" for export in catalogue["exports"])
+
+
+def write_if_changed(path, text):
+    """An unchanged file keeps its time, so that nothing is linked anew for it."""
+    path = Path(path)
+    if not path.exists() or path.read_text("utf-8") != text:
+        path.parent.mkdir(parents=True, exist_ok=True)
+        path.write_text(text, "utf-8")
+
+
+def main(arguments=None):
+    parser = argparse.ArgumentParser(description=__doc__.split("\n")[0])
+    parser.add_argument("include", help="the folder that holds qx/")
+    parser.add_argument("--json", metavar="FILE")
+    parser.add_argument("--map", metavar="FILE")
+    parser.add_argument("--def", metavar="FILE", dest="definition")
+    options = parser.parse_args(arguments)
+    try:
+        catalogue = read_headers(options.include)
+    except (HeaderError, OSError) as error:
+        print(error, file=sys.stderr)
+        return 1
+    if options.json:
+        write_if_changed(options.json, json.dumps(catalogue, indent=1) + "\n")
+    if options.map:
+        write_if_changed(options.map, version_script(catalogue))
+    if options.definition:
+        write_if_changed(options.definition, definition_file(catalogue))
+    return 0
+
+
+if __name__ == "__main__":
+    sys.exit(main())
