@@ -11,7 +11,9 @@ foreach(function IN ITEMS sin cos tan asin acos atan atan2 sinh cosh tanh exp ex
 endforeach()
 
 if(CMAKE_SIZEOF_VOID_P EQUAL 4)
-    target_compile_options(qxflags INTERFACE -msse2 -mfpmath=sse -mstackrealign)
+    # The compiler warns of the byte alignment that element types lose as template arguments.
+    target_compile_options(qxflags INTERFACE -msse2 -mfpmath=sse -mstackrealign
+        $<$<COMPILE_LANGUAGE:CXX>:-Wno-ignored-attributes>)
 endif()
 if(NOT QX_ARCH STREQUAL "baseline")
     target_compile_options(qxflags INTERFACE -march=${QX_ARCH})

@@ -1,0 +1,13 @@
+# GoogleTest for another target comes from the sources that Debian's package googletest installs.
+if(NOT EXISTS /usr/src/googletest/CMakeLists.txt)
+    message(FATAL_ERROR "The tests need GoogleTest's sources: apt-get install googletest")
+endif()
+set(BUILD_GMOCK OFF)
+set(INSTALL_GTEST OFF)
+set(gtest_disable_pthreads OFF)
+add_subdirectory(/usr/src/googletest ${CMAKE_BINARY_DIR}/googletest EXCLUDE_FROM_ALL)
+foreach(library IN ITEMS gtest gtest_main)
+    if(NOT TARGET GTest::${library})
+        add_library(GTest::${library} ALIAS ${library})
+    endif()
+endforeach()

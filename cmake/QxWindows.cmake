@@ -1,0 +1,14 @@
+# The files have the names that the host and the module look for.
+set(CMAKE_SHARED_LIBRARY_PREFIX "")
+
+# Links a module as the host expects it: imports from KERNEL32, USER32 and the C run-time alone,
+# exports undecorated. The language run-time is that of the compiler without POSIX threads.
+function(qx_link_as_host_module target)
+    execute_process(COMMAND i686-w64-mingw32-g++-win32 -print-libgcc-file-name
+        OUTPUT_VARIABLE archive OUTPUT_STRIP_TRAILING_WHITESPACE RESULT_VARIABLE failed)
+    if(failed)
+        message(FATAL_ERROR "Missing compiler: apt-get install g++-mingw-w64-i686-win32")
+    endif()
+    get_filename_component(folder ${archive} DIRECTORY)
+    target_link_options(${target} PRIVATE -L${folder} -Wl,--exclude-libs,ALL)
+endfunction()
