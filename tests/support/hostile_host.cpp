@@ -116,6 +116,22 @@ void RunSweeps() {
     }
 }
 
+void RunSweepOf(void *argument) {
+    SweepProcedure sweep = nullptr;
+    {
+        const HeapProbe::Pause pause;
+        const std::lock_guard hold(Blocks().lock);
+        for (auto entry = Blocks().sweeps.begin(); entry != Blocks().sweeps.end(); ++entry)
+            if (entry->first.second == argument) {
+                sweep = entry->first.first;
+                Blocks().sweeps.erase(entry);
+                break;
+            }
+    }
+    if (sweep != nullptr)
+        sweep(argument);
+}
+
 int RegisteredSweeps() { return static_cast<int>(Blocks().sweeps.size()); }
 
 void CheckBlocks() {

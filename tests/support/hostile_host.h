@@ -37,18 +37,37 @@ void ResetHost(int32_t failAt = 0, int32_t failStatus = 0);
 // Calls every registered sweep, as the host does after an aborted run. An object's sweep is
 // forgotten with the call.
 void RunSweeps();
+// The same for the sweep that was registered with this argument, if there is one.
+void RunSweepOf(void *argument);
 int RegisteredSweeps();
 
 // Throws if a guard or a poisoned byte has changed since; called by every reshape and free too.
 void CheckBlocks();
 int LiveBlocks();
 
-namespace detail {
-// The type of an element without its alignment of one byte: template arguments drop that.
-template <class T>
-struct Aligned {
-    using type = T;
+// Elements with the alignment of their C++ type, for values on their own.
+template <ElementType Code>
+struct Plain {
+    typedef typename Element<Code>::type type;
 };
+template <>
+struct Plain<ElementType::DBL> {
+    typedef double type;
+};
+template <>
+struct Plain<ElementType::SGL> {
+    typedef float type;
+};
+template <>
+struct Plain<ElementType::I32> {
+    typedef int32_t type;
+};
+template <>
+struct Plain<ElementType::U32> {
+    typedef uint32_t type;
+};
+
+namespace detail {
 void *NewBlock(int32_t numDims, std::size_t elementSize, int32_t rows, int32_t cols);
 void FreeBlock(void *handle);
 int32_t ReshapeBlock(int32_t typeCode, int32_t numDims, void *handleAddress, int32_t count);
@@ -60,7 +79,7 @@ template <ElementType Code>
 class Array1D {
 public:
     typedef typename Element<Code>::type T;
-    typedef typename detail::Aligned<T>::type Value;
+    typedef typename Plain<Code>::type Value;
 
     explicit Array1D(int32_t n = 0)
         : handle_(static_cast<Array1DHandle>(detail::NewBlock(1, sizeof(T), n, 0))) {}
@@ -96,7 +115,7 @@ template <ElementType Code>
 class Array2D {
 public:
     typedef typename Element<Code>::type T;
-    typedef typename detail::Aligned<T>::type Value;
+    typedef typename Plain<Code>::type Value;
 
     Array2D(int32_t rows = 0, int32_t cols = 0)
         : handle_(static_cast<Array2DHandle>(detail::NewBlock(2, sizeof(T), rows, cols))) {}

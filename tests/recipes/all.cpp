@@ -1,0 +1,26 @@
+#include "tests/recipes/families.h"
+
+namespace qx::test {
+
+const std::vector<Recipe> &AllRecipes() {
+    static const std::vector<Recipe> all = [] {
+        std::vector<Recipe> recipes;
+        for (const auto &family : {BasicStatisticsRecipes()})
+            recipes.insert(recipes.end(), family.begin(), family.end());
+        return recipes;
+    }();
+    return all;
+}
+
+const std::vector<Exempt> &ExemptExports() {
+    static const std::vector<Exempt> exempt = {
+        {"InitializeAnalysisWorkspaceH", "no arrays; frame/tests drives the four together"},
+        {"EnableAnalysisWorkspaceH", "as above"},
+        {"DisableAnalysisWorkspaceH", "as above"},
+        {"UninitializeAnalysisWorkspaceH", "as above"},
+        {"SetQXRTModule", "changes the process; frame/tests calls it in a process of its own"},
+    };
+    return exempt;
+}
+
+} // namespace qx::test
