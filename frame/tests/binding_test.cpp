@@ -1,15 +1,33 @@
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <array>
 #include <cstdio>
 #include <string>
+
+#ifndef _WIN32
 #include <sys/wait.h>
+#endif
 
 // Where the module finds its host: each case in a process of its own.
 
 namespace {
 
-const std::string folder = QX_BINDING_FOLDER;
+#ifdef _WIN32
+// The command interpreter takes a path with backslashes only.
+std::string Path(std::string path) {
+    std::replace(path.begin(), path.end(), '/', '\\');
+    return path;
+}
+FILE *Open(const std::string &command) { return _popen(command.c_str(), "r"); }
+int Close(FILE *pipe) { return _pclose(pipe); }
+std::string Library(const std::string &name) { return Path(QX_HOST_FOLDER + name + ".dll"); }
+#else
+std::string Path(std::string path) { return path; }
+FILE *Open(const std::string &command) { return popen(command.c_str(), "r"); }
+int Close(FILE *pipe) { return WEXITSTATUS(pclose(pipe)); }
+std::string Library(const std::string &name) { return QX_HOST_FOLDER "lib" + name + ".so"; }
+#endif
 
 struct Outcome {
     int exitCode;
@@ -17,20 +35,19 @@ struct Outcome {
 };
 
 Outcome RunProbe(const std::string &program, const std::string &arguments = "") {
-    FILE *pipe = popen((folder + "/" + program + " " + arguments + " 2>&1").c_str(), "r");
+    FILE *pipe = Open(Path(QX_PROBE_FOLDER + program) + " " + arguments + " 2>&1");
     std::string text;
     std::array<char, 256> buffer;
     while (std::fgets(buffer.data(), buffer.size(), pipe) != nullptr)
         text += buffer.data();
-    return {WEXITSTATUS(pclose(pipe)), text};
+    std::erase(text, '\r');
+    return {Close(pipe), text};
 }
 
-std::string Library(const std::string &name) { return folder + "/hosts/" + name; }
-
 TEST(Binding, SearchesFourPlacesInOrder) {
-    const std::string runtime = Library("libqxrt.so");
-    const std::string second = Library("libqxffrt.so");
-    const std::string other = Library("libother.so");
+    const std::string runtime = Library("qxrt");
+    const std::string second = Library("qxffrt");
+    const std::string other = Library("other");
     const auto found = [](const Outcome &outcome) {
         EXPECT_EQ(outcome.exitCode, 0) << outcome.text;
         return outcome.text;
@@ -50,7 +67,7 @@ TEST(Binding, WithoutAHostTheProcessEnds) {
     // A host that lacks the function is not passed over for one that has it.
     const std::string missing =
         "Fatal Error: dataloom.lib could not locate \"HostRegisterSweep\".\n";
-    for (const std::string &arguments : {std::string(), Library("libqxrt.so")}) {
+    for (const std::string &arguments : {std::string(), Library("qxrt")}) {
         const Outcome partial = RunProbe("probe_partial", arguments);
         EXPECT_EQ(partial.exitCode, 1);
         EXPECT_EQ(partial.text, missing);

@@ -4,7 +4,11 @@
 // A host of one function, which says where it was found. QX_FAKE_NAME tells which host this is;
 // QX_FAKE_MARK is the name by which a main program is known as a host.
 
+#ifdef _WIN32
+#define QX_FAKE_EXPORT extern "C" __declspec(dllexport)
+#else
 #define QX_FAKE_EXPORT extern "C" __attribute__((visibility("default")))
+#endif
 
 #ifdef QX_FAKE_MARK
 QX_FAKE_EXPORT int32_t QX_FAKE_MARK() { return 0; }

@@ -1,18 +1,19 @@
+#include "frame/tests/binding/system.h"
 #include "qx/frame.h"
-
-#include <dlfcn.h>
 
 #include <cstdio>
 #include <cstring>
 
 // Loads the libraries that are named, hands the one behind "set" to SetQXRTModule, and reserves
-// the workspace, which asks the host to register a sweep.
+// the workspace, which asks the host to register a sweep. A fatal message goes to the standard
+// error as "caption: text".
 int main(int argc, char **argv) {
+    PrintFatalMessages();
     for (int i = 1; i < argc; ++i) {
         const bool set = std::strcmp(argv[i], "set") == 0;
-        void *module = dlopen(argv[set ? ++i : i], RTLD_NOW);
+        void *module = LoadModule(argv[set ? ++i : i]);
         if (module == nullptr) {
-            std::fprintf(stderr, "%s\n", dlerror());
+            std::fprintf(stderr, "%s cannot be loaded\n", argv[i]);
             return 3;
         }
         if (set && SetQXRTModule(module, 0) != module)

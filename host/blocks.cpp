@@ -1,0 +1,155 @@
+#include "qx/host.h"
+
+#include <cstddef>
+#include <cstdint>
+#include <cstdlib>
+#include <cstring>
+
+namespace {
+
+// A block of memory, front to back: what malloc gave, unused bytes, this, the dimension fields,
+// and the elements at a multiple of `elementAlignment`.
+struct Front {
+    void *memory;
+    std::size_t capacity; // bytes from the first dimension field on
+};
+
+constexpr std::size_t elementAlignment = 64;
+constexpr std::size_t shrinkAbove = 4096; // smaller blocks are never worth a move
+
+std::size_t ElementSize(int32_t typeCode) {
+    switch (typeCode) {
+    case QXTypeU8:
+        return 1;
+    case QXTypeI32:
+    case QXTypeU32:
+    case QXTypeSGL:
+        return 4;
+    case QXTypeDBL:
+    case QXTypeCSG:
+        return 8;
+    case QXTypeCDB:
+        return 16;
+    default:
+        return 0;
+    }
+}
+
+constexpr std::size_t FieldsSize(int32_t numDims) {
+    return sizeof(int32_t) * static_cast<std::size_t>(numDims);
+}
+
+Front FrontOf(const void *block) {
+    Front front;
+    std::memcpy(&front, static_cast<const char *>(block) - sizeof front, sizeof front);
+    return front;
+}
+
+// The address of the dimension fields of a block for so many elements, or null.
+void *NewBlock(int32_t numDims, uint64_t count, std::size_t elementSize, bool cleared) {
+    const std::size_t fields = FieldsSize(numDims);
+    const std::size_t overhead = sizeof(Front) + fields + elementAlignment;
+    if (count > (PTRDIFF_MAX - overhead) / elementSize)
+        return nullptr;
+    const std::size_t size = static_cast<std::size_t>(count) * elementSize;
+    void *memory = cleared ? std::calloc(1, overhead + size) : std::malloc(overhead + size);
+    if (memory == nullptr)
+        return nullptr;
+    const auto start = reinterpret_cast<uintptr_t>(memory) + sizeof(Front) + fields;
+    const uintptr_t elements = (start + elementAlignment - 1) / elementAlignment * elementAlignment;
+    char *block =
+        static_cast<char *>(memory) + (elements - fields) - reinterpret_cast<uintptr_t>(memory);
+    const Front front = {memory, fields + size};
+    std::memcpy(block - sizeof front, &front, sizeof front);
+    return block;
+}
+
+void FreeBlock(void *block) { std::free(FrontOf(block).memory); }
+
+void *NewArray(int32_t numDims, std::size_t elementSize, const int32_t *sizes,
+               const void *elements) {
+    uint64_t count = 1;
+    for (int32_t i = 0; i < numDims; ++i) {
+        if (sizes[i] < 0)
+            return nullptr;
+        count *= static_cast<uint64_t>(sizes[i]);
+    }
+    if (elementSize == 0 || count > INT32_MAX)
+        return nullptr;
+    void *block = NewBlock(numDims, count, elementSize, elements == nullptr);
+    auto *handle = block != nullptr ? static_cast<void **>(std::malloc(sizeof(void *))) : nullptr;
+    if (handle == nullptr) {
+        if (block != nullptr)
+            FreeBlock(block);
+        return nullptr;
+    }
+    std::memcpy(block, sizes, FieldsSize(numDims));
+    if (elements != nullptr && count > 0)
+        std::memcpy(static_cast<char *>(block) + FieldsSize(numDims), elements,
+                    static_cast<std::size_t>(count) * elementSize);
+    *handle = block;
+    return handle;
+}
+
+Array1DHandle New1D(std::size_t elementSize, int32_t count, const void *elements) {
+    return static_cast<Array1DHandle>(NewArray(1, elementSize, &count, elements));
+}
+
+Array2DHandle New2D(std::size_t elementSize, int32_t rows, int32_t cols, const void *elements) {
+    const int32_t sizes[2] = {rows, cols};
+    return static_cast<Array2DHandle>(NewArray(2, elementSize, sizes, elements));
+}
+
+} // namespace
+
+int32_t gQXRTVersion = 1;
+
+Array1DHandle QXHostNew1D(int32_t typeCode, int32_t count) {
+    return New1D(ElementSize(typeCode), count, nullptr);
+}
+
+Array2DHandle QXHostNew2D(int32_t typeCode, int32_t rows, int32_t cols) {
+    return New2D(ElementSize(typeCode), rows, cols, nullptr);
+}
+
+Array1DHandle QXHostCopy1D(int32_t typeCode, int32_t count, const void *elements) {
+    return New1D(ElementSize(typeCode), count, elements);
+}
+
+Array2DHandle QXHostCopy2D(int32_t typeCode, int32_t rows, int32_t cols, const void *elements) {
+    return New2D(ElementSize(typeCode), rows, cols, elements);
+}
+
+Array1DHandle QXHostCopyRecords(int32_t recordSize, int32_t count, const void *records) {
+    return New1D(recordSize > 0 ? static_cast<std::size_t>(recordSize) : 0, count, records);
+}
+
+void QXHostFree(void *handle) {
+    if (handle == nullptr)
+        return;
+    FreeBlock(*static_cast<void **>(handle));
+    std::free(handle);
+}
+
+int32_t HostBlockReshape(int32_t typeCode, int32_t numDims, void *handleAddress, int32_t count) {
+    const std::size_t elementSize = ElementSize(typeCode);
+    if (elementSize == 0 || count < 0 || numDims < 1 || numDims > 2 || handleAddress == nullptr)
+        return QXHostBadArgument;
+    void **handle = *static_cast<void ***>(handleAddress);
+    if (handle == nullptr)
+        return QXHostBadArgument;
+
+    const auto wanted = static_cast<uint64_t>(count);
+    const uint64_t size = FieldsSize(numDims) + wanted * elementSize;
+    const std::size_t capacity = FrontOf(*handle).capacity;
+    const bool fits = size <= capacity;
+    if (fits && (capacity <= shrinkAbove || size >= capacity / 2))
+        return QXHostDone;
+    void *moved = NewBlock(numDims, wanted, elementSize, false);
+    if (moved == nullptr)
+        return fits ? QXHostDone : QXHostNoMemory;
+    std::memcpy(moved, *handle, fits ? static_cast<std::size_t>(size) : capacity);
+    FreeBlock(*handle);
+    *handle = moved;
+    return QXHostDone;
+}

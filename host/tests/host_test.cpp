@@ -1,0 +1,199 @@
+#include "qx/frame.h"
+#include "qx/host.hpp"
+
+#include <gtest/gtest.h>
+
+#include <atomic>
+#include <cstring>
+#include <thread>
+#include <vector>
+
+namespace {
+
+using qx::host::Array1D;
+using qx::host::Array2D;
+
+constexpr int32_t allTypes[] = {QXTypeI32, QXTypeU8,  QXTypeU32, QXTypeSGL,
+                                QXTypeDBL, QXTypeCSG, QXTypeCDB};
+constexpr std::size_t sizes[] = {4, 1, 4, 4, 8, 8, 16};
+
+TEST(Blocks, KeepTheirElementsThroughGrowthAndShrinking) {
+    for (std::size_t type = 0; type < std::size(allTypes); ++type) {
+        Array1DHandle array = QXHostNew1D(allTypes[type], 5);
+        ASSERT_NE(array, nullptr);
+        EXPECT_EQ((*array)->dimSize, 5);
+        EXPECT_EQ(static_cast<char *>(QXHostElements1D(array)) - reinterpret_cast<char *>(*array),
+                  4);
+        const std::size_t bytes = 5 * sizes[type];
+        EXPECT_EQ(std::vector<char>(bytes, 0),
+                  std::vector<char>(static_cast<char *>(QXHostElements1D(array)),
+                                    static_cast<char *>(QXHostElements1D(array)) + bytes));
+        std::memset(QXHostElements1D(array), 0x5A, bytes);
+        for (const int32_t count : {100000, 5, 0}) {
+            ASSERT_EQ(HostBlockReshape(allTypes[type], 1, &array, count), 0);
+            // Every byte that was asked for is there: the sanitizer looks on.
+            std::memset(static_cast<char *>(QXHostElements1D(array)) +
+                            (count > 5 ? bytes : count * sizes[type]),
+                        0x11, count > 5 ? (count - 5) * sizes[type] : 0);
+            if (count > 0) {
+                EXPECT_EQ(std::vector<char>(bytes, 0x5A),
+                          std::vector<char>(static_cast<char *>(QXHostElements1D(array)),
+                                            static_cast<char *>(QXHostElements1D(array)) + bytes));
+            }
+        }
+        QXHostFree(array);
+    }
+    QXHostFree(nullptr);
+}
+
+TEST(Blocks, OfTwoDimensionsStartAtByteEight) {
+    const double values[] = {1, 2, 3, 4, 5, 6};
+    Array2DHandle array = QXHostCopy2D(QXTypeDBL, 2, 3, values);
+    const char *block = reinterpret_cast<char *>(*array);
+    double last;
+    std::memcpy(&last, block + 8 + 5 * 8, sizeof last);
+    EXPECT_EQ(last, 6);
+    EXPECT_EQ((*array)->dimSizes[0], 2);
+    EXPECT_EQ((*array)->dimSizes[1], 3);
+    QXHostFree(array);
+}
+
+TEST(Blocks, RefuseWhatCannotBe) {
+    Array1DHandle array = QXHostNew1D(QXTypeDBL, 2);
+    Array1DHandle none = nullptr;
+    static_cast<double *>(QXHostElements1D(array))[1] = 7;
+    EXPECT_EQ(HostBlockReshape(QXTypeDBL, 1, &array, -1), QXHostBadArgument);
+    EXPECT_EQ(HostBlockReshape(QXTypeDBL, 1, &array, INT32_MIN), QXHostBadArgument);
+    for (const int32_t type : {0, 4, 6, 8, 11, 14, -1})
+        EXPECT_EQ(HostBlockReshape(type, 1, &array, 3), QXHostBadArgument) << type;
+    EXPECT_EQ(HostBlockReshape(QXTypeDBL, 0, &array, 3), QXHostBadArgument);
+    EXPECT_EQ(HostBlockReshape(QXTypeDBL, 3, &array, 3), QXHostBadArgument);
+    EXPECT_EQ(HostBlockReshape(QXTypeDBL, 1, nullptr, 3), QXHostBadArgument);
+    EXPECT_EQ(HostBlockReshape(QXTypeDBL, 1, &none, 3), QXHostBadArgument);
+    if (sizeof(void *) == 4) {
+        EXPECT_EQ(HostBlockReshape(QXTypeCDB, 1, &array, INT32_MAX), QXHostNoMemory);
+    }
+    EXPECT_EQ((*array)->dimSize, 2);
+    EXPECT_EQ(static_cast<double *>(QXHostElements1D(array))[1], 7)
+        << "a refusal changed the array";
+    QXHostFree(array);
+
+    EXPECT_EQ(QXHostNew1D(QXTypeDBL, -1), nullptr);
+    EXPECT_EQ(QXHostNew1D(2, 1), nullptr);
+    EXPECT_EQ(QXHostNew2D(QXTypeDBL, -1, -1), nullptr);
+    EXPECT_EQ(QXHostNew2D(QXTypeU8, 65536, 65536), nullptr) << "the product does not fit in int32";
+    EXPECT_EQ(QXHostCopyRecords(0, 1, ""), nullptr);
+}
+
+TEST(Arrays, OfTheCppLayerOwnTheirBlocks) {
+    Array1D<double> x{1.5, -2.5};
+    const Array1DHandle handle = x.handle();
+    Array1D<double> y(std::move(x));
+    EXPECT_EQ(y.handle(), handle);
+    x = std::move(y);
+    EXPECT_EQ(x.size(), 2);
+    EXPECT_EQ(x[1], -2.5);
+    const std::vector<std::complex<double>> values = {{1, 2}, {3, 4}};
+    Array1D<std::complex<double>> z{std::span<const std::complex<double>>(values)};
+    EXPECT_EQ(z[1], values[1]);
+    const float cells[] = {1, 2, 3, 4, 5, 6};
+    Array2D<float> m(2, 3, cells);
+    m.at(1, 0) += 10;
+    EXPECT_EQ(m.row(1)[0], 14);
+    EXPECT_THROW(Array2D<float>(2, 2, cells), std::invalid_argument);
+    EXPECT_THROW(Array1D<double>(-1), std::bad_alloc);
+    try {
+        qx::host::check(WarnLengthsDiffer);
+        qx::host::check(ErrNotSquare);
+        FAIL() << "a failure did not throw";
+    } catch (const qx::host::Error &error) {
+        EXPECT_EQ(error.code(), ErrNotSquare);
+        EXPECT_STREQ(error.name(), "ErrNotSquare");
+        EXPECT_STREQ(error.what(), QXHostErrorText(ErrNotSquare));
+    }
+}
+
+struct Counter {
+    int calls = 0;
+    Counter *withdraws = nullptr;
+    bool registersAnew = false;
+};
+
+int32_t Count(void *argument) {
+    auto *counter = static_cast<Counter *>(argument);
+    ++counter->calls;
+    if (counter->withdraws != nullptr)
+        HostRegisterSweep(Count, counter->withdraws, 0);
+    if (counter->registersAnew)
+        HostRegisterSweep(Count, counter, 2);
+    return 0;
+}
+
+TEST(Sweeps, RunOncePerRunAndObjectsAreForgotten) {
+    Counter process, object, withdrawn, replaced, removedMeanwhile;
+    object.withdraws = &removedMeanwhile;
+    replaced.registersAnew = true;
+    for (Counter *counter : {&object, &withdrawn, &removedMeanwhile, &replaced})
+        EXPECT_EQ(HostRegisterSweep(Count, counter, 2), 0);
+    EXPECT_EQ(HostRegisterSweep(Count, &process, 1), 0);
+    EXPECT_EQ(HostRegisterSweep(Count, &process, 1), 0);
+    EXPECT_EQ(HostRegisterSweep(Count, &withdrawn, 0), 0);
+    EXPECT_EQ(HostRegisterSweep(Count, &withdrawn, 0), 0) << "withdrawing twice is no error";
+    EXPECT_NE(HostRegisterSweep(nullptr, &object, 2), 0);
+    EXPECT_NE(HostRegisterSweep(Count, &object, 3), 0);
+
+    EXPECT_EQ(QXHostRunSweeps(), 3);
+    replaced.registersAnew = false;
+    EXPECT_EQ(QXHostRunSweeps(), 2);
+    EXPECT_EQ(process.calls, 2);
+    EXPECT_EQ(object.calls, 1);
+    EXPECT_EQ(withdrawn.calls, 0);
+    EXPECT_EQ(removedMeanwhile.calls, 0);
+    EXPECT_EQ(replaced.calls, 2);
+
+    EXPECT_EQ(HostRegisterSweep(Count, &object, 2), 0);
+    EXPECT_EQ(QXHostReleaseObject(&process), 0) << "a process's sweep is no object's";
+    EXPECT_EQ(QXHostReleaseObject(&object), 1);
+    EXPECT_EQ(QXHostReleaseObject(&object), 0);
+    HostRegisterSweep(Count, &process, 0);
+    EXPECT_EQ(QXHostRunSweeps(), 0);
+}
+
+TEST(Sweeps, FromManyThreadsAllArrive) {
+    constexpr int perThread = 200;
+    std::vector<Counter> counters(4 * perThread);
+    std::vector<std::thread> threads;
+    for (int t = 0; t < 4; ++t)
+        threads.emplace_back([&, t] {
+            for (int i = 0; i < perThread; ++i) {
+                HostRegisterSweep(Count, &counters[t * perThread + i], 2);
+                if (i % 2 == 1)
+                    HostRegisterSweep(Count, &counters[t * perThread + i], 0);
+            }
+        });
+    for (std::thread &thread : threads)
+        thread.join();
+    EXPECT_EQ(QXHostRunSweeps(), 4 * perThread / 2);
+}
+
+// The module finds this host by the name of its library and registers its sweep there.
+TEST(Module, BindsToTheStandInHost) {
+    WorkspaceStatus status = {0, 0};
+    InitializeAnalysisWorkspaceH(1000, &status);
+    EXPECT_EQ(status.code, 0);
+    EXPECT_EQ(QXHostRunSweeps(), 1);
+    UninitializeAnalysisWorkspaceH(&status);
+    EXPECT_EQ(status.code, 0);
+    EnableAnalysisWorkspaceH(&status);
+    EXPECT_EQ(status.code, ErrWorkspaceNotInitialized);
+}
+
+TEST(Texts, AreThereForUnknownCodesToo) {
+    EXPECT_STREQ(QXHostErrorName(-20003), "ErrEmptyInput");
+    EXPECT_STREQ(QXHostErrorName(20004), "WarnLengthsDiffer");
+    EXPECT_STREQ(QXHostErrorName(QXHostNoMemory), "HostNoMemory");
+    EXPECT_STREQ(QXHostErrorName(-20009), "Unknown");
+    EXPECT_STRNE(QXHostErrorText(-20009), "");
+}
+
+} // namespace

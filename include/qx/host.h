@@ -1,0 +1,82 @@
+#ifndef QX_HOST_H
+#define QX_HOST_H
+
+/* The stand-in host: what a program needs that calls the exports without the host environment.
+   It makes and frees arrays, resizes them for the exports, runs the clean-up procedures that the
+   exports register, and holds the message texts of all codes. C11 and C++20; a C++ program may
+   prefer qx/host.hpp.
+
+   All functions may be called from any thread. One array belongs to one call at a time, unless
+   all calls only read it. */
+
+#include "qx/errors.h"
+#include "qx/types.h"
+
+#if defined(_WIN32) && defined(QX_BUILDING_HOST)
+#define QX_HOST_API __declspec(dllexport)
+#elif defined(_WIN32)
+#define QX_HOST_API __declspec(dllimport)
+#else
+#define QX_HOST_API __attribute__((visibility("default")))
+#endif
+
+QX_BEGIN_DECLS
+
+/* The host's own statuses. The transform exports pass them on. */
+enum QXHostStatus {
+    QXHostDone = 0,
+    QXHostBadArgument = 1, /* a count below 0, an unknown type code, a number of dimensions that is
+                              neither 1 nor 2, a null handle */
+    QXHostNoMemory = 2     /* the memory cannot be had, or its size cannot be expressed */
+};
+
+/* Arrays. The functions give null where a size is below 0, the type code is unknown or the memory
+   cannot be had. Elements start at an address that is a multiple of 64. Every array is given back
+   with QXHostFree; null is allowed there. */
+
+/* Elements of one of the codes of QXTypeCode, all zero. */
+QX_HOST_API Array1DHandle QXHostNew1D(int32_t typeCode, int32_t count);
+QX_HOST_API Array2DHandle QXHostNew2D(int32_t typeCode, int32_t rows, int32_t cols);
+/* The same with the elements copied from memory of the caller's. */
+QX_HOST_API Array1DHandle QXHostCopy1D(int32_t typeCode, int32_t count, const void *elements);
+QX_HOST_API Array2DHandle QXHostCopy2D(int32_t typeCode, int32_t rows, int32_t cols,
+                                       const void *elements);
+/* Records of the caller's, for the exports that take an array of them. Such an array cannot be
+   resized. */
+QX_HOST_API Array1DHandle QXHostCopyRecords(int32_t recordSize, int32_t count, const void *records);
+QX_HOST_API void QXHostFree(void *handle);
+
+/* The first element. It moves with every resize, so with every call that has the array as an
+   output. */
+static inline void *QXHostElements1D(Array1DHandle array) { return *array + 1; }
+static inline void *QXHostElements2D(Array2DHandle array) { return *array + 1; }
+
+/* Called by the exports. Makes room for `count` elements, 0 or a status. The block may move; its
+   old elements are kept as far as they fit, new ones are not set, and the dimension fields are
+   left to the caller. A refusal leaves the array as it is. */
+QX_HOST_API int32_t HostBlockReshape(int32_t typeCode, int32_t numDims, void *handleAddress,
+                                     int32_t count);
+
+/* Called by the exports. Mode 1 registers a clean-up procedure for the process, mode 2 one for an
+   object, which is `argument`; mode 0 withdraws. A second registration of the same procedure and
+   argument replaces the first. */
+typedef int32_t (*QXHostSweep)(void *argument);
+QX_HOST_API int32_t HostRegisterSweep(QXHostSweep procedure, void *argument, int32_t mode);
+
+/* What the host does after a run was aborted: calls every registered procedure in the order of
+   registration and forgets those for objects. No export may be running. Slots then hold words
+   that are no longer valid: set them to null. Gives the number of procedures called. */
+QX_HOST_API int32_t QXHostRunSweeps(void);
+/* The same for one object, such as the word that a plan slot holds. */
+QX_HOST_API int32_t QXHostReleaseObject(void *object);
+
+/* A sentence for the user, and the name in errors.h; never null. Host statuses have theirs too. */
+QX_HOST_API const char *QXHostErrorText(ErrorCode code);
+QX_HOST_API const char *QXHostErrorName(ErrorCode code);
+
+/* By this name a module is known as a host. */
+extern QX_HOST_API int32_t gQXRTVersion;
+
+QX_END_DECLS
+
+#endif
