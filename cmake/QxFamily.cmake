@@ -18,6 +18,10 @@ function(qx_test name)
     add_executable(${name} ${ARGN})
     set_target_properties(${name} PROPERTIES ENABLE_EXPORTS ON)
     target_link_libraries(${name} PRIVATE qxanalysis qxcore qxtestsupport GTest::gtest_main)
+    qx_run_as_test(${name})
+endfunction()
+
+function(qx_run_as_test name)
     add_test(NAME ${name} COMMAND ${name} --gtest_brief=1)
     # The runner of another target says so where it cannot run anything.
     set_tests_properties(${name} PROPERTIES SKIP_RETURN_CODE 77)
