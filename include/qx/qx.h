@@ -4,6 +4,7 @@
 /* Every export of the module. */
 
 #include "qx/errors.h"
+#include "qx/fft.h"
 #include "qx/frame.h"
 #include "qx/types.h"
 

@@ -1,0 +1,19 @@
+#ifndef QX_FFT_EXECUTE_H
+#define QX_FFT_EXECUTE_H
+
+#include "fft/plan.h"
+
+#include <cstddef>
+
+namespace qx {
+
+// The forward transforms of a plan's own length. Inside the engine strides are as wide as
+// addresses: those of inner stages are products of lengths.
+ErrorCode ExecuteComplex(const FFTPlan &plan, const DBL *inRe, const DBL *inIm, DBL *outRe,
+                         DBL *outIm, std::ptrdiff_t inStride, std::ptrdiff_t outStride);
+ErrorCode ExecuteReal(const FFTPlan &plan, const DBL *in, DBL *out, std::ptrdiff_t inStride,
+                      std::ptrdiff_t outStride);
+
+} // namespace qx
+
+#endif

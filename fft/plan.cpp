@@ -1,0 +1,274 @@
+#include "fft/plan.h"
+
+#include "fft/execute.h"
+#include "fft/kernels/kernels.h"
+#include "frame/platform.h"
+
+#include <cmath>
+#include <cstddef>
+#include <cstdlib>
+#include <limits>
+#include <mutex>
+#include <utility>
+
+namespace qx {
+namespace {
+
+using std::ptrdiff_t;
+
+constexpr double twoPi = 6.283185307179586;
+
+// The cache: every plan that has a holder, the newest first.
+platform::Mutex cacheMutex;
+FFTPlan *cacheHead = nullptr;
+
+FFTPlan *Acquire(int32_t length);
+void Release(FFTPlan *plan);
+
+// A table from the heap, for a plan outlives the workspace. Sizes that int32 cannot count are
+// refused on every target alike.
+template <class T>
+bool Allocate(T *&table, int64_t count) {
+    if (count * int64_t{sizeof(T)} > std::numeric_limits<int32_t>::max())
+        return false;
+    table = static_cast<T *>(std::malloc(static_cast<std::size_t>(count) * sizeof(T)));
+    return table != nullptr;
+}
+
+void Append(FFTPlan *plan, int32_t factor, int32_t kind) {
+    plan->factors[plan->factorCount] = factor;
+    plan->kinds[plan->factorCount] = kind;
+    ++plan->factorCount;
+}
+
+void Factorise(FFTPlan *plan) {
+    int32_t n = plan->length;
+    for (const int32_t radix : kernelRadices)
+        for (; n % radix == 0; n /= radix)
+            Append(plan, radix, KernelFactor);
+    for (int32_t d = 3; int64_t{d} * d <= n; d += 2)
+        for (; n % d == 0; n /= d)
+            Append(plan, d, d < 50 ? DirectPrime : RaderPrime);
+    if (n > 1)
+        Append(plan, n, n <= 49 ? DirectPrime : RaderPrime);
+    // The smallest factor becomes stage 0, the largest the leaf.
+    for (int32_t i = 0; i < plan->factorCount; ++i) {
+        for (int32_t j = i + 1; j < plan->factorCount; ++j) {
+            if (plan->factors[j] < plan->factors[i]) {
+                std::swap(plan->factors[i], plan->factors[j]);
+                std::swap(plan->kinds[i], plan->kinds[j]);
+            }
+        }
+    }
+}
+
+// The powers of exp(-i theta) from the first up: each from the one before by a recurrence whose
+// error stays small because 1 - cos(theta), formed without cancellation, is small.
+class Roots {
+public:
+    explicit Roots(double theta) : s_(-std::sin(theta)) {
+        const double half = std::sin(theta * 0.5);
+        c_ = 2.0 * half * half;
+        re = 1.0 - c_;
+        im = s_;
+    }
+    void advance() {
+        const double oldRe = re;
+        const double oldIm = im;
+        re = oldRe - (oldRe * c_ + oldIm * s_);
+        im = oldIm - (oldIm * c_ - oldRe * s_);
+    }
+
+    double re, im;
+
+private:
+    double c_, s_;
+};
+
+bool BuildTwiddles(FFTStage *stage, int32_t p, int32_t n) {
+    const ptrdiff_t m = n / p;
+    const ptrdiff_t pitch = p - 1;
+    if (!Allocate(stage->twiddleCos, (m - 1) * int64_t{pitch}) ||
+        !Allocate(stage->twiddleSin, (m - 1) * int64_t{pitch}))
+        return false;
+    const double step = twoPi / n;
+    for (int32_t j = 1; j < p; ++j) {
+        Roots roots(j * step);
+        for (ptrdiff_t k = 1; k < m; ++k) {
+            stage->twiddleCos[(k - 1) * pitch + (j - 1)] = roots.re;
+            stage->twiddleSin[(k - 1) * pitch + (j - 1)] = roots.im;
+            roots.advance();
+        }
+    }
+    return true;
+}
+
+bool BuildRoots(FFTStage *stage, int32_t p) {
+    if (!Allocate(stage->rootCos, p) || !Allocate(stage->rootSin, p))
+        return false;
+    stage->rootCos[0] = 1.0;
+    stage->rootSin[0] = 0.0;
+    Roots roots(twoPi / p);
+    for (int32_t k = 1; k < p; ++k) {
+        stage->rootCos[k] = roots.re;
+        stage->rootSin[k] = roots.im;
+        roots.advance();
+    }
+    return true;
+}
+
+// The smallest g whose powers reach 1 modulo the prime p only after p - 1 steps.
+int32_t Generator(int32_t p) {
+    for (int32_t g = 2;; ++g) {
+        int32_t order = 1;
+        for (int64_t power = g; power != 1; power = power * g % p)
+            ++order;
+        if (order == p - 1)
+            return g;
+    }
+}
+
+void BuildRaderOrders(FFTStage *stage, int32_t p) {
+    stage->raderGather[0] = stage->raderScatter[0] = 0;
+    stage->raderGather[1] = stage->raderScatter[1] = 1;
+    const int32_t g = Generator(p);
+    int64_t power = g;
+    for (int32_t i = 2; i < p; ++i) {
+        stage->raderScatter[i] = static_cast<int32_t>(power);
+        stage->raderGather[p + 1 - i] = static_cast<int32_t>(power);
+        power = power * g % p;
+    }
+}
+
+// The spectrum of the roots in the order of the powers of the generator; temporary holds
+// 2 (p - 1) values.
+bool BuildRaderSpectrum(FFTStage *stage, int32_t p, DBL *temporary) {
+    const int32_t n = p - 1;
+    Roots roots(twoPi / p);
+    for (int32_t t = 0; t < n; ++t) {
+        stage->raderCos[t] = roots.re;
+        stage->raderSin[t] = roots.im;
+        roots.advance();
+    }
+    const double scale = 1.0 / n;
+    for (int32_t i = 0; i < n; ++i) {
+        const int32_t root = stage->raderScatter[i + 1] - 1;
+        temporary[i] = stage->raderCos[root] * scale;
+        temporary[n + i] = stage->raderSin[root] * scale;
+    }
+    return ExecuteComplex(*stage->raderPlan, temporary, temporary + n, stage->raderCos,
+                          stage->raderSin, 1, 1) == 0;
+}
+
+bool BuildRader(FFTStage *stage, int32_t p) {
+    if (!Allocate(stage->raderCos, p - 1) || !Allocate(stage->raderSin, p - 1) ||
+        !Allocate(stage->raderGather, p) || !Allocate(stage->raderScatter, p))
+        return false;
+    stage->raderPlan = Acquire(p - 1);
+    DBL *temporary = nullptr;
+    if (stage->raderPlan == nullptr || !Allocate(temporary, 2 * int64_t{p - 1}))
+        return false;
+    BuildRaderOrders(stage, p);
+    const bool built = BuildRaderSpectrum(stage, p, temporary);
+    std::free(temporary);
+    return built;
+}
+
+bool BuildStages(FFTPlan *plan) {
+    int32_t n = plan->length;
+    for (int32_t s = 0; s < plan->factorCount; ++s) {
+        const int32_t p = plan->factors[s];
+        plan->stages[s] = static_cast<FFTStage *>(std::calloc(1, sizeof(FFTStage)));
+        FFTStage *const stage = plan->stages[s];
+        if (stage == nullptr)
+            return false;
+        if (s + 1 < plan->factorCount && !BuildTwiddles(stage, p, n))
+            return false;
+        if (plan->kinds[s] == DirectPrime && !BuildRoots(stage, p))
+            return false;
+        if (plan->kinds[s] == RaderPrime && !BuildRader(stage, p))
+            return false;
+        n /= p;
+    }
+    return true;
+}
+
+void FillKernels(FFTPlan *plan) {
+    for (int32_t s = 0; s < plan->factorCount; ++s) {
+        if (plan->kinds[s] != KernelFactor)
+            continue;
+        const KernelSet &kernels = KernelsOf(plan->factors[s]);
+        plan->realLeaf[s] = kernels.realLeaf;
+        plan->realTwiddle[s] = kernels.realTwiddle;
+        plan->complexLeaf[s] = kernels.complexLeaf;
+        plan->complexTwiddle[s] = kernels.complexTwiddle;
+    }
+}
+
+// Releases a plan, whole or as far as it was built.
+void Dismantle(FFTPlan *plan) {
+    for (FFTStage *stage : plan->stages) {
+        if (stage == nullptr)
+            continue;
+        for (DBL *table : {stage->rootCos, stage->rootSin, stage->twiddleCos, stage->twiddleSin,
+                           stage->raderCos, stage->raderSin})
+            std::free(table);
+        std::free(stage->raderGather);
+        std::free(stage->raderScatter);
+        Release(stage->raderPlan);
+        std::free(stage);
+    }
+    std::free(plan);
+}
+
+// The rest runs under the mutex.
+
+FFTPlan *Acquire(int32_t length) {
+    if (length < 1)
+        return nullptr;
+    for (FFTPlan *plan = cacheHead; plan != nullptr; plan = plan->next) {
+        if (plan->length == length) {
+            ++plan->refCount;
+            return plan;
+        }
+    }
+    auto *const plan = static_cast<FFTPlan *>(std::calloc(1, sizeof(FFTPlan)));
+    if (plan == nullptr)
+        return nullptr;
+    plan->length = length;
+    Factorise(plan);
+    FillKernels(plan);
+    if (!BuildStages(plan)) {
+        Dismantle(plan);
+        return nullptr;
+    }
+    plan->refCount = 1;
+    plan->next = cacheHead;
+    if (cacheHead != nullptr)
+        cacheHead->prev = plan;
+    cacheHead = plan;
+    return plan;
+}
+
+void Release(FFTPlan *plan) {
+    if (plan == nullptr || --plan->refCount > 0)
+        return;
+    (plan->prev != nullptr ? plan->prev->next : cacheHead) = plan->next;
+    if (plan->next != nullptr)
+        plan->next->prev = plan->prev;
+    Dismantle(plan);
+}
+
+} // namespace
+
+FFTPlan *create_oxfft_table(int32_t length) {
+    const std::lock_guard<platform::Mutex> lock(cacheMutex);
+    return Acquire(length);
+}
+
+void destroy_oxfft_table(FFTPlan *plan) {
+    const std::lock_guard<platform::Mutex> lock(cacheMutex);
+    Release(plan);
+}
+
+} // namespace qx

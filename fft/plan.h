@@ -1,0 +1,108 @@
+#ifndef QX_FFT_PLAN_H
+#define QX_FFT_PLAN_H
+
+#include "qx/errors.h"
+#include "qx/fft.h"
+#include "qx/types.h"
+
+#include <cstdint>
+
+namespace qx {
+
+// Kernels of one radix p. Strides count in DBL units; `count` and `m` are numbers of columns.
+//
+// A leaf computes `count` transforms: number i reads element i + j count of the input, j from 0
+// to p - 1, and writes its p results to the elements i p onward of the output.
+typedef void (*RealLeaf)(const DBL *in, DBL *out, int32_t inStride, int32_t outStride,
+                         int32_t count);
+typedef void (*ComplexLeaf)(const DBL *inRe, const DBL *inIm, DBL *outRe, DBL *outIm,
+                            int32_t inStride, int32_t outStride, int32_t count);
+// A twiddle kernel combines, in place, p transforms of length m, block after block, into one of
+// length p m. The twiddles are those of the stage.
+typedef void (*RealTwiddle)(DBL *data, const DBL *twiddleCos, const DBL *twiddleSin, int32_t stride,
+                            int32_t m);
+typedef void (*ComplexTwiddle)(DBL *re, DBL *im, const DBL *twiddleCos, const DBL *twiddleSin,
+                               int32_t stride, int32_t m);
+
+// How the p-point transform of a factor p is done: by a kernel of straight-line code, as a plain
+// sum (a prime below 50 that has no kernel), or by Rader's algorithm (any other prime).
+enum FactorKind : int32_t { KernelFactor = 0, DirectPrime = 1, RaderPrime = 2 };
+
+} // namespace qx
+
+// The tables of one factor p; what the factor does not need is null.
+struct FFTStage {
+    // Direct prime: exp(-2 pi i k / p), p values.
+    DBL *rootCos, *rootSin;
+    // Every stage but the last, which works on sub-transforms of length n and has m = n / p:
+    // exp(-2 pi i j k / n) at index (k - 1)(p - 1) + (j - 1), k from 1 to m - 1, j from 1 to p - 1.
+    DBL *twiddleCos, *twiddleSin;
+    // Rader prime: the plan of length p - 1, held by reference, the spectrum of the roots in the
+    // order of the powers of a generator, scaled by 1 / (p - 1), and the two orders of p indices.
+    FFTPlan *raderPlan;
+    DBL *raderCos, *raderSin;
+    int32_t *raderGather, *raderScatter;
+};
+
+// Everything that a transform of one length needs. Read-only from its creation to its release.
+struct FFTPlan {
+    static constexpr int32_t maxFactors = 20; // no int32 length has more
+
+    int32_t length;
+    int32_t refCount;            // changes under the cache's mutex only
+    int32_t factors[maxFactors]; // ascending; the last is the leaf
+    int32_t kinds[maxFactors];   // qx::FactorKind
+    int32_t factorCount;         // 0 for length 1
+    FFTStage *stages[maxFactors];
+    qx::RealLeaf realLeaf[maxFactors];
+    qx::RealTwiddle realTwiddle[maxFactors];
+    qx::ComplexLeaf complexLeaf[maxFactors];
+    qx::ComplexTwiddle complexTwiddle[maxFactors];
+    FFTPlan *prev, *next; // the cache
+};
+
+namespace qx {
+
+// The inner side of the two exports of the same names: the shared plan of a length, or null, and
+// its return. (Qualified in calls: the exports are visible too.)
+FFTPlan *create_oxfft_table(int32_t length);
+void destroy_oxfft_table(FFTPlan *plan);
+
+// Forward transform, unscaled: X[k] is the sum over j of x[j] exp(-2 pi i j k / n). The inverse has
+// the opposite sign and the factor 1/n. Input and output are different memory; strides count in
+// DBL units, so interleaved complex data has stride 2. Any number of threads may share a plan.
+//
+// ErrOutOfMemory: scratch memory for a prime factor without a kernel; the output is incomplete.
+// A plan of another length gives -1.
+ErrorCode FFTComplexForward(const FFTPlan *plan, const DBL *inRe, const DBL *inIm, DBL *outRe,
+                            DBL *outIm, int32_t inStride, int32_t outStride, int32_t n);
+ErrorCode FFTComplexInverse(const FFTPlan *plan, const DBL *inRe, const DBL *inIm, DBL *outRe,
+                            DBL *outIm, int32_t inStride, int32_t outStride, int32_t n);
+
+// The transforms of real data. The spectrum is in half-complex form h: h[k] is Re X[k] for k from
+// 0 to n/2, h[n-k] is Im X[k] for k from 1 to (n-1)/2. The inverse uses its input as work memory.
+// A plan of another length gives ErrInternal.
+ErrorCode FFTRealForward(const FFTPlan *plan, const DBL *in, DBL *out, int32_t inStride,
+                         int32_t outStride, int32_t n);
+ErrorCode FFTRealInverse(const FFTPlan *plan, DBL *in, DBL *out, int32_t inStride,
+                         int32_t outStride, int32_t n);
+
+// A plan held for the scope.
+class PlanReference {
+public:
+    explicit PlanReference(int32_t length) : plan_(qx::create_oxfft_table(length)) {}
+    ~PlanReference() { qx::destroy_oxfft_table(plan_); }
+    PlanReference(const PlanReference &) = delete;
+    PlanReference &operator=(const PlanReference &) = delete;
+
+    // Null if the length is below 1 or memory ran out.
+    const FFTPlan *get() const { return plan_; }
+    explicit operator bool() const { return plan_ != nullptr; }
+
+private:
+    FFTPlan *plan_;
+};
+
+} // namespace qx
+
+#endif

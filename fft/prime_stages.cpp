@@ -1,0 +1,313 @@
+#include "fft/prime_stages.h"
+
+#include "fft/execute.h"
+#include "frame/scratch.h"
+
+#include <cstddef>
+
+namespace qx {
+namespace {
+
+using std::ptrdiff_t;
+
+// Complex values at a stride.
+struct Input {
+    const DBL *re, *im;
+    ptrdiff_t stride;
+};
+struct Output {
+    DBL *re, *im;
+    ptrdiff_t stride;
+
+    void set(ptrdiff_t i, double real, double imaginary) const {
+        re[i * stride] = real;
+        im[i * stride] = imaginary;
+    }
+};
+
+Output Interleaved(DBL *values) { return {values, values + 1, 2}; }
+
+// The p-point transforms. They gather their input into `work` first, so they may work in place.
+// Each takes 2p values of work, the real Rader transform 4p.
+
+ErrorCode DirectComplex(const PrimeFactor &factor, Input x, Output y, DBL *work) {
+    const ptrdiff_t p = factor.p;
+    const ptrdiff_t h = p / 2;
+    const DBL *const rootCos = factor.stage->rootCos;
+    const DBL *const rootSin = factor.stage->rootSin;
+    const double x0Re = x.re[0];
+    const double x0Im = x.im[0];
+    double sumRe = x0Re;
+    double sumIm = x0Im;
+    for (ptrdiff_t i = 1; i <= h; ++i) {
+        const ptrdiff_t left = i * x.stride;
+        const ptrdiff_t right = (p - i) * x.stride;
+        DBL *const mirrored = work + 4 * (i - 1);
+        mirrored[0] = x.re[left] + x.re[right];
+        mirrored[1] = x.im[left] - x.im[right];
+        mirrored[2] = x.re[left] - x.re[right];
+        mirrored[3] = x.im[left] + x.im[right];
+        sumRe += mirrored[0];
+        sumIm += mirrored[3];
+    }
+    y.set(0, sumRe, sumIm);
+    for (ptrdiff_t q = 1; q <= h; ++q) {
+        double re = x0Re;
+        double im = x0Im;
+        double mirrorRe = x0Re;
+        double mirrorIm = x0Im;
+        ptrdiff_t e = 0;
+        for (ptrdiff_t i = 1; i <= h; ++i) {
+            e += q;
+            if (e >= p)
+                e -= p;
+            const DBL *const mirrored = work + 4 * (i - 1);
+            const double c = rootCos[e];
+            const double s = rootSin[e];
+            const double ac = mirrored[0] * c;
+            const double bs = mirrored[1] * s;
+            const double cs = mirrored[2] * s;
+            const double dc = mirrored[3] * c;
+            re += ac - bs;
+            im += dc + cs;
+            mirrorRe += ac + bs;
+            mirrorIm += dc - cs;
+        }
+        y.set(q, re, im);
+        y.set(p - q, mirrorRe, mirrorIm);
+    }
+    return 0;
+}
+
+ErrorCode DirectReal(const PrimeFactor &factor, const DBL *x, ptrdiff_t inStride, DBL *y,
+                     ptrdiff_t outStride, DBL *work) {
+    const ptrdiff_t p = factor.p;
+    const ptrdiff_t h = p / 2;
+    const double x0 = x[0];
+    double sum = x0;
+    for (ptrdiff_t i = 1; i <= h; ++i) {
+        work[2 * i - 2] = x[i * inStride] + x[(p - i) * inStride];
+        work[2 * i - 1] = x[i * inStride] - x[(p - i) * inStride];
+        sum += work[2 * i - 2];
+    }
+    y[0] = sum;
+    for (ptrdiff_t q = 1; q <= h; ++q) {
+        double re = x0;
+        double im = 0;
+        ptrdiff_t e = 0;
+        for (ptrdiff_t i = 1; i <= h; ++i) {
+            e += q;
+            if (e >= p)
+                e -= p;
+            re += work[2 * i - 2] * factor.stage->rootCos[e];
+            im += work[2 * i - 1] * factor.stage->rootSin[e];
+        }
+        y[q * outStride] = re;
+        y[(p - q) * outStride] = im;
+    }
+    return 0;
+}
+
+// Multiplies value i - 1 of the spectrum by that of the roots and conjugates it: together with the
+// conjugation at the end, a forward transform then serves as the inverse one.
+void SetConjugateProduct(const FFTStage &stage, ptrdiff_t i, double a, double b, Output y) {
+    const double c = stage.raderCos[i - 1];
+    const double s = stage.raderSin[i - 1];
+    y.set(i, c * a - s * b, -(a * s) - c * b);
+}
+
+ErrorCode RaderComplex(const PrimeFactor &factor, Input x, Output y, DBL *work) {
+    const FFTStage &stage = *factor.stage;
+    const ptrdiff_t p = factor.p;
+    const Output gathered = Interleaved(work);
+    const double x0Re = x.re[0];
+    const double x0Im = x.im[0];
+    double sumRe = x0Re;
+    double sumIm = x0Im;
+    for (ptrdiff_t i = 1; i < p; ++i) {
+        const ptrdiff_t source = stage.raderGather[i] * x.stride;
+        gathered.set(i - 1, x.re[source], x.im[source]);
+        sumRe += x.re[source];
+        sumIm += x.im[source];
+    }
+    y.set(0, sumRe, sumIm);
+    ErrorCode status = ExecuteComplex(*stage.raderPlan, gathered.re, gathered.im, y.re + y.stride,
+                                      y.im + y.stride, 2, y.stride);
+    if (status < 0)
+        return status;
+    for (ptrdiff_t i = 1; i < p; ++i)
+        SetConjugateProduct(stage, i, y.re[i * y.stride], y.im[i * y.stride], y);
+    status = ExecuteComplex(*stage.raderPlan, y.re + y.stride, y.im + y.stride, gathered.re,
+                            gathered.im, y.stride, 2);
+    if (status < 0)
+        return status;
+    for (ptrdiff_t i = 1; i < p; ++i)
+        y.set(stage.raderScatter[i], x0Re + work[2 * i - 2], x0Im - work[2 * i - 1]);
+    return 0;
+}
+
+ErrorCode RaderReal(const PrimeFactor &factor, const DBL *x, ptrdiff_t inStride, DBL *y,
+                    ptrdiff_t outStride, DBL *work) {
+    const FFTStage &stage = *factor.stage;
+    const ptrdiff_t p = factor.p;
+    const ptrdiff_t n = p - 1;
+    DBL *const half = work; // n values, half-complex
+    const Output spectrum = Interleaved(work + 2 * p);
+    DBL *const gathered = spectrum.re; // n values, before the spectrum
+    const double x0 = x[0];
+    double sum = x0;
+    for (ptrdiff_t i = 1; i < p; ++i) {
+        gathered[i - 1] = x[stage.raderGather[i] * inStride];
+        sum += gathered[i - 1];
+    }
+    ErrorCode status = ExecuteReal(*stage.raderPlan, gathered, half, 1, 1);
+    if (status < 0)
+        return status;
+    // The n values of the spectrum go to places 1 to n, as the product counts them.
+    SetConjugateProduct(stage, 1, half[0], 0, spectrum);
+    for (ptrdiff_t k = 1; 2 * k < n; ++k) {
+        SetConjugateProduct(stage, k + 1, half[k], half[n - k], spectrum);
+        SetConjugateProduct(stage, n - k + 1, half[k], -half[n - k], spectrum);
+    }
+    SetConjugateProduct(stage, n / 2 + 1, half[n / 2], 0, spectrum);
+    status =
+        ExecuteComplex(*stage.raderPlan, spectrum.re + 2, spectrum.im + 2, work, work + 1, 2, 2);
+    if (status < 0)
+        return status;
+    y[0] = sum;
+    for (ptrdiff_t i = 1; i < p; ++i) {
+        const ptrdiff_t k = stage.raderScatter[i];
+        if (2 * k > p)
+            continue;
+        y[k * outStride] = x0 + work[2 * i - 2];
+        y[(p - k) * outStride] = -work[2 * i - 1];
+    }
+    return 0;
+}
+
+ErrorCode TransformComplex(const PrimeFactor &factor, Input x, Output y, DBL *work) {
+    return (factor.kind == DirectPrime ? DirectComplex : RaderComplex)(factor, x, y, work);
+}
+ErrorCode TransformReal(const PrimeFactor &factor, const DBL *x, ptrdiff_t inStride, DBL *y,
+                        ptrdiff_t outStride, DBL *work) {
+    return (factor.kind == DirectPrime ? DirectReal : RaderReal)(factor, x, inStride, y, outStride,
+                                                                 work);
+}
+
+// Value times the twiddle of column k and block j.
+void SetTwiddled(const PrimeFactor &factor, ptrdiff_t k, ptrdiff_t j, double re, double im,
+                 Output column) {
+    const ptrdiff_t entry = (k - 1) * (factor.p - 1) + (j - 1);
+    const double c = factor.stage->twiddleCos[entry];
+    const double s = factor.stage->twiddleSin[entry];
+    column.set(j, re * c - im * s, re * s + im * c);
+}
+
+// Columns k and m - k of the real twiddle stage.
+ErrorCode PrimePair(const PrimeFactor &factor, DBL *data, ptrdiff_t stride, ptrdiff_t m,
+                    ptrdiff_t k, DBL *work) {
+    const ptrdiff_t p = factor.p;
+    const ptrdiff_t n = p * m;
+    const Output column = Interleaved(work);
+    column.set(0, data[k * stride], data[(m - k) * stride]);
+    for (ptrdiff_t j = 1; j < p; ++j) {
+        const DBL *const block = data + j * m * stride;
+        SetTwiddled(factor, k, j, block[k * stride], block[(m - k) * stride], column);
+    }
+    const ErrorCode status =
+        TransformComplex(factor, {column.re, column.im, 2}, column, work + 2 * p);
+    if (status < 0)
+        return status;
+    for (ptrdiff_t q = 0; q < p; ++q) {
+        const ptrdiff_t t = k + q * m;
+        const bool direct = t <= (n - 1) / 2;
+        data[(direct ? t : n - t) * stride] = work[2 * q];
+        data[(direct ? n - t : t) * stride] = direct ? work[2 * q + 1] : -work[2 * q + 1];
+    }
+    return 0;
+}
+
+// Column m/2 of the real twiddle stage: real values, p odd.
+ErrorCode PrimeMiddle(const PrimeFactor &factor, DBL *data, ptrdiff_t stride, ptrdiff_t m,
+                      DBL *work) {
+    const ptrdiff_t p = factor.p;
+    const ptrdiff_t n = p * m;
+    const ptrdiff_t k = m / 2;
+    const Output column = Interleaved(work);
+    column.set(0, data[k * stride], 0);
+    for (ptrdiff_t j = 1; j < p; ++j)
+        SetTwiddled(factor, k, j, data[(j * m + k) * stride], 0, column);
+    const ErrorCode status =
+        TransformComplex(factor, {column.re, column.im, 2}, column, work + 2 * p);
+    if (status < 0)
+        return status;
+    for (ptrdiff_t q = 0; k + q * m <= n / 2; ++q) {
+        const ptrdiff_t t = k + q * m;
+        data[t * stride] = work[2 * q];
+        if (2 * t < n)
+            data[(n - t) * stride] = work[2 * q + 1];
+    }
+    return 0;
+}
+
+} // namespace
+
+ErrorCode PrimeComplexLeaf(const PrimeFactor &factor, const DBL *inRe, const DBL *inIm, DBL *outRe,
+                           DBL *outIm, ptrdiff_t inStride, ptrdiff_t outStride, int32_t count) {
+    const ptrdiff_t p = factor.p;
+    Scratch<ElementType::DBL> work;
+    ErrorCode status = work.allocate(2 * int64_t{p});
+    for (ptrdiff_t i = 0; i < count && status == 0; ++i) {
+        const Input x = {inRe + i * inStride, inIm + i * inStride, count * inStride};
+        const Output y = {outRe + i * p * outStride, outIm + i * p * outStride, outStride};
+        status = TransformComplex(factor, x, y, work.data());
+    }
+    return Merge(status, work.release());
+}
+
+ErrorCode PrimeRealLeaf(const PrimeFactor &factor, const DBL *in, DBL *out, ptrdiff_t inStride,
+                        ptrdiff_t outStride, int32_t count) {
+    const ptrdiff_t p = factor.p;
+    Scratch<ElementType::DBL> work;
+    ErrorCode status = work.allocate(int64_t{p} * (factor.kind == DirectPrime ? 1 : 4));
+    for (ptrdiff_t i = 0; i < count && status == 0; ++i)
+        status = TransformReal(factor, in + i * inStride, count * inStride, out + i * p * outStride,
+                               outStride, work.data());
+    return Merge(status, work.release());
+}
+
+ErrorCode PrimeComplexTwiddle(const PrimeFactor &factor, DBL *re, DBL *im, ptrdiff_t stride,
+                              int32_t m) {
+    const ptrdiff_t p = factor.p;
+    Scratch<ElementType::DBL> work;
+    ErrorCode status = work.allocate(4 * int64_t{p});
+    if (status < 0)
+        return status;
+    const Output column = Interleaved(work.data());
+    for (ptrdiff_t k = 0; k < m && status == 0; ++k) {
+        const Output y = {re + k * stride, im + k * stride, m * stride};
+        column.set(0, y.re[0], y.im[0]);
+        for (ptrdiff_t j = 1; j < p; ++j) {
+            if (k == 0)
+                column.set(j, y.re[j * y.stride], y.im[j * y.stride]);
+            else
+                SetTwiddled(factor, k, j, y.re[j * y.stride], y.im[j * y.stride], column);
+        }
+        status = TransformComplex(factor, {column.re, column.im, 2}, y, work.data() + 2 * p);
+    }
+    return Merge(status, work.release());
+}
+
+ErrorCode PrimeRealTwiddle(const PrimeFactor &factor, DBL *data, ptrdiff_t stride, int32_t m) {
+    Scratch<ElementType::DBL> work;
+    ErrorCode status = work.allocate(4 * int64_t{factor.p});
+    if (status == 0)
+        status = TransformReal(factor, data, m * stride, data, m * stride, work.data());
+    for (ptrdiff_t k = 1; k <= (m - 1) / 2 && status == 0; ++k)
+        status = PrimePair(factor, data, stride, m, k, work.data());
+    if (m % 2 == 0 && status == 0)
+        status = PrimeMiddle(factor, data, stride, m, work.data());
+    return Merge(status, work.release());
+}
+
+} // namespace qx

@@ -1,0 +1,129 @@
+#include "fft/plan.h"
+
+#include <gtest/gtest.h>
+
+#include <cmath>
+#include <cstdint>
+#include <limits>
+#include <utility>
+#include <vector>
+
+namespace {
+
+using qx::PlanReference;
+
+typedef std::vector<std::pair<int32_t, int32_t>> Factors; // factor, kind
+
+Factors FactorsOf(const FFTPlan &plan) {
+    Factors factors;
+    for (int32_t i = 0; i < plan.factorCount; ++i)
+        factors.emplace_back(plan.factors[i], plan.kinds[i]);
+    return factors;
+}
+
+TEST(Plan, FactorisesIntoRadicesAndPrimes) {
+    const std::pair<int32_t, Factors> cases[] = {
+        {1, {}},
+        {20, {{2, 0}, {10, 0}}},
+        {48, {{3, 0}, {16, 0}}},
+        {1000, {{10, 0}, {10, 0}, {10, 0}}},
+        {1024, {{32, 0}, {32, 0}}},
+        {2048, {{2, 0}, {32, 0}, {32, 0}}},
+        {36, {{2, 0}, {18, 0}}},
+        {162, {{9, 0}, {18, 0}}},
+        {23, {{23, 1}}},
+        {46, {{2, 0}, {23, 1}}},
+        {47, {{47, 1}}},
+        {53, {{53, 2}}},
+        {106, {{2, 0}, {53, 2}}},
+        {2809, {{53, 2}, {53, 2}}},
+        {23 * 47 * 59, {{23, 1}, {47, 1}, {59, 2}}},
+        {23 * 23 * 41, {{23, 1}, {23, 1}, {41, 0}}},
+        {99991, {{99991, 2}}},
+    };
+    for (const auto &[length, expected] : cases) {
+        const PlanReference plan(length);
+        ASSERT_TRUE(plan) << length;
+        EXPECT_EQ(FactorsOf(*plan.get()), expected) << length;
+        EXPECT_EQ(plan.get()->length, length);
+    }
+}
+
+TEST(Plan, SharesOnePlanPerLength) {
+    FFTPlan *const first = qx::create_oxfft_table(360);
+    FFTPlan *const second = qx::create_oxfft_table(360);
+    EXPECT_EQ(first, second);
+    EXPECT_EQ(first->refCount, 2);
+    qx::destroy_oxfft_table(first);
+    EXPECT_EQ(second->refCount, 1);
+    qx::destroy_oxfft_table(second);
+    qx::destroy_oxfft_table(nullptr);
+    EXPECT_EQ(qx::create_oxfft_table(0), nullptr);
+    EXPECT_EQ(qx::create_oxfft_table(-7), nullptr);
+    EXPECT_EQ(qx::create_oxfft_table(std::numeric_limits<int32_t>::min()), nullptr);
+}
+
+TEST(Plan, PrimePlansHoldTheirSubPlans) {
+    FFTPlan *const plan107 = qx::create_oxfft_table(107);
+    FFTPlan *const plan106 = plan107->stages[0]->raderPlan;
+    FFTPlan *const plan52 = plan106->stages[1]->raderPlan;
+    EXPECT_EQ(plan106->length, 106);
+    EXPECT_EQ(plan52->length, 52);
+    EXPECT_EQ(FactorsOf(*plan52), (Factors{{4, 0}, {13, 0}}));
+    {
+        const PlanReference also52(52);
+        const PlanReference also53(53);
+        EXPECT_EQ(also52.get(), plan52);
+        EXPECT_EQ(plan52->refCount, 3); // 106, 53 and this test
+    }
+    EXPECT_EQ(plan52->refCount, 1);
+    {
+        const PlanReference keeps52(52);
+        qx::destroy_oxfft_table(plan107);
+        EXPECT_EQ(plan52->refCount, 1);
+        EXPECT_EQ(plan52->prev, nullptr);
+        EXPECT_EQ(plan52->next, nullptr); // 107 and 106 have left the cache
+    }
+}
+
+TEST(Plan, HoldsTheRootsAtTheirPlaces) {
+    const PlanReference plan(4 * 13 * 23); // factors 4, 13, 23
+    const FFTPlan &table = *plan.get();
+    int32_t n = table.length;
+    const long double turn = 8 * std::atan(1.0L);
+    for (int32_t s = 0; s + 1 < table.factorCount; ++s) {
+        const int32_t p = table.factors[s];
+        for (int32_t k = 1; k < n / p; ++k) {
+            for (int32_t j = 1; j < p; ++j) {
+                const int32_t at = (k - 1) * (p - 1) + j - 1;
+                const long double angle = turn * j * k / n;
+                ASSERT_NEAR(table.stages[s]->twiddleCos[at], std::cos(angle), 1e-14);
+                ASSERT_NEAR(table.stages[s]->twiddleSin[at], -std::sin(angle), 1e-14);
+            }
+        }
+        n /= p;
+    }
+    EXPECT_EQ(table.stages[2]->twiddleCos, nullptr);
+    for (int32_t k = 0; k < 23; ++k) {
+        EXPECT_NEAR(table.stages[2]->rootCos[k], std::cos(turn * k / 23), 1e-15);
+        EXPECT_NEAR(table.stages[2]->rootSin[k], -std::sin(turn * k / 23), 1e-15);
+    }
+
+    // 5 generates the units modulo 73; no smaller number does.
+    const PlanReference prime(73);
+    const FFTStage &rader = *prime.get()->stages[0];
+    int32_t power = 1;
+    for (int32_t i = 1; i < 73; ++i) {
+        EXPECT_EQ(rader.raderScatter[i], power);
+        EXPECT_EQ(rader.raderGather[i] * power % 73, 1);
+        power = power * 5 % 73;
+    }
+}
+
+TEST(Plan, TableThatCannotBeHeldIsNull) {
+    EXPECT_EQ(qx::create_oxfft_table(std::numeric_limits<int32_t>::max()), nullptr);
+    EXPECT_EQ(qx::create_oxfft_table(std::numeric_limits<int32_t>::max() - 1), nullptr);
+    EXPECT_EQ(qx::create_oxfft_table(1 << 30), nullptr);
+}
+
+} // namespace
