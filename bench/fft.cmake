@@ -1,0 +1,1 @@
+qx_bench(fft SOURCES fft.cpp PEERS fftw3)

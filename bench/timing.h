@@ -1,0 +1,89 @@
+#ifndef QX_BENCH_TIMING_H
+#define QX_BENCH_TIMING_H
+
+#include <algorithm>
+#include <array>
+#include <chrono>
+#include <cmath>
+#include <cstddef>
+#include <cstdio>
+#include <string>
+#include <vector>
+
+// Times as medians of interleaved runs: every contestant runs once in each round, so that what
+// disturbs the machine disturbs all of them alike.
+
+namespace qx::bench {
+
+inline double Median(std::vector<double> values) {
+    std::nth_element(values.begin(), values.begin() + values.size() / 2, values.end());
+    return values[values.size() / 2];
+}
+
+template <class Work>
+double SecondsOf(std::size_t repeats, const Work &work) {
+    const auto start = std::chrono::steady_clock::now();
+    for (std::size_t i = 0; i < repeats; ++i)
+        work();
+    return std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count();
+}
+
+// So many repeats that a run takes about `seconds`; the work is warm afterwards.
+template <class Work>
+std::size_t RepeatsFor(double seconds, const Work &work) {
+    for (std::size_t repeats = 1;; repeats *= 2) {
+        const double taken = SecondsOf(repeats, work);
+        if (taken > seconds / 4)
+            return std::max<std::size_t>(1, static_cast<std::size_t>(repeats * seconds / taken));
+    }
+}
+
+// The seconds that one call of each contestant takes.
+template <class... Work>
+std::array<double, sizeof...(Work)> MedianTimes(const Work &...contestants) {
+    constexpr double runSeconds = 1e-4;
+    constexpr int rounds = 25;
+    const std::array<std::size_t, sizeof...(Work)> repeats = {
+        RepeatsFor(runSeconds, contestants)...};
+    std::array<std::vector<double>, sizeof...(Work)> times;
+    for (int round = 0; round < rounds; ++round) {
+        std::size_t i = 0;
+        ((times[i].push_back(SecondsOf(repeats[i], contestants) / repeats[i]), ++i), ...);
+    }
+    std::array<double, sizeof...(Work)> medians;
+    std::transform(times.begin(), times.end(), medians.begin(), Median);
+    return medians;
+}
+
+// The ratios ours/peer of one group of rows, with their geometric mean and the worst of them.
+class Ratios {
+public:
+    explicit Ratios(std::string name) : name_(std::move(name)) {}
+    void add(double ratio) {
+        logarithms_ += std::log(ratio);
+        worst_ = std::max(worst_, ratio);
+        ++count_;
+    }
+    double mean() const { return count_ > 0 ? std::exp(logarithms_ / count_) : 0; }
+    void print() const {
+        if (count_ > 0)
+            std::printf("%-44s geometric mean %5.2f  worst %5.2f  (%d)\n", name_.c_str(), mean(),
+                        worst_, count_);
+    }
+
+private:
+    std::string name_;
+    double logarithms_ = 0;
+    double worst_ = 0;
+    int count_ = 0;
+};
+
+// Keeps a result, so that the compiler cannot drop the work that made it.
+template <class T>
+void Keep(const T &value) {
+    asm volatile("" : : "r"(&value) : "memory");
+}
+
+} // namespace qx::bench
+
+#endif
