@@ -6,6 +6,7 @@
 #include "qx/errors.h"
 #include "qx/fft.h"
 #include "qx/frame.h"
+#include "qx/stats.h"
 #include "qx/types.h"
 
 #endif

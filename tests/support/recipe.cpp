@@ -46,6 +46,7 @@ void Call::remember(Array &array) {
 }
 
 Array1DHandle Call::inRecords(int number, int32_t count, const void *records, std::size_t bytes) {
+    const HeapProbe::Pause pause;
     const int32_t stored = countOf(number, count);
     auto array = std::make_unique<Array1<ElementType::U8>>(static_cast<int32_t>(bytes));
     std::memcpy(array->array.data(), records, bytes);
@@ -56,14 +57,28 @@ Array1DHandle Call::inRecords(int number, int32_t count, const void *records, st
     return handle;
 }
 
-double *Call::scalar(int number) { return &(scalars_[number] = 12345.0); }
-int32_t *Call::integer(int number) { return &(integers_[number] = 12345); }
+double *Call::scalar(int number) {
+    const HeapProbe::Pause pause;
+    return &(scalars_[number] = 12345.0);
+}
+
+int32_t *Call::integer(int number) {
+    const HeapProbe::Pause pause;
+    return &(integers_[number] = 12345);
+}
+
+void **Call::slot(int number) {
+    const HeapProbe::Pause pause;
+    return &slots_[number];
+}
 
 const int32_t *Call::byReference(int32_t value) {
+    const HeapProbe::Pause pause;
     int32Values_.push_back(std::make_unique<int32_t>(value));
     return int32Values_.back().get();
 }
 const double *Call::byReference(double value) {
+    const HeapProbe::Pause pause;
     doubleValues_.push_back(std::make_unique<double>(value));
     return doubleValues_.back().get();
 }

@@ -1,12 +1,14 @@
 #ifndef QX_TESTS_RECIPE_H
 #define QX_TESTS_RECIPE_H
 
+#include "tests/support/heap_probe.h"
 #include "tests/support/hostile_host.h"
 
 #include <cstdint>
 #include <functional>
 #include <map>
 #include <memory>
+#include <ostream>
 #include <string>
 #include <vector>
 
@@ -92,6 +94,7 @@ public:
     // A record or a pair that is an output but follows no rule on failure.
     template <class Record>
     Record *record(int number) {
+        const HeapProbe::Pause pause;
         auto &bytes = records_[number];
         bytes.assign(sizeof(Record), 0);
         return reinterpret_cast<Record *>(bytes.data());
@@ -105,7 +108,7 @@ public:
     ErrorCode *err();
 
     // Words that a node keeps: null at first. The call gives back what they hold.
-    void **slot(int number) { return &slots_[number]; }
+    void **slot(int number);
     void **instance(int32_t (*release)(void **)) {
         releaseInstance_ = release;
         return &instance_;
@@ -180,6 +183,8 @@ struct Recipe {
     unsigned quirks = None;
     std::vector<int32_t> sizes = {1, 2, 3, 8, 50, 1000};
 };
+
+inline void PrintTo(const Recipe &recipe, std::ostream *stream) { *stream << recipe.name; }
 
 // All recipes, in the order of their families.
 const std::vector<Recipe> &AllRecipes();

@@ -1,6 +1,8 @@
 #ifndef QX_TESTS_RECIPE_ARRAYS_H
 #define QX_TESTS_RECIPE_ARRAYS_H
 
+#include "tests/support/heap_probe.h"
+
 // The templates of Call; included by recipe.h.
 
 namespace qx::test {
@@ -60,6 +62,7 @@ struct Call::Array2 : Call::Array {
 
 template <ElementType Code>
 Array1DHandle Call::make(Arrays &arrays, int number, int32_t count, double (*value)(int32_t)) {
+    const HeapProbe::Pause pause;
     auto array = std::make_unique<Array1<Code>>(countOf(number, count));
     detail::Fill(array->array.data(), array->array.size(), number, value);
     remember(*array);
@@ -75,6 +78,7 @@ Array1DHandle Call::in(int number, int32_t count, double (*value)(int32_t)) {
 
 template <ElementType Code>
 Array2DHandle Call::in2D(int number, int32_t rows, int32_t cols, double (*value)(int32_t)) {
+    const HeapProbe::Pause pause;
     auto array = std::make_unique<Array2<Code>>(countOf(number, rows), countOf(number, cols));
     detail::Fill(array->array.data(), array->array.size(), number, value);
     remember(*array);
@@ -85,6 +89,7 @@ Array2DHandle Call::in2D(int number, int32_t rows, int32_t cols, double (*value)
 
 template <ElementType Code>
 Array1DHandle Call::out(int number) {
+    const HeapProbe::Pause pause;
     auto array = std::make_unique<Array1<Code>>(3);
     const Array1DHandle handle = array->array.handle();
     outputs_[number] = std::move(array);
@@ -93,6 +98,7 @@ Array1DHandle Call::out(int number) {
 
 template <ElementType Code>
 Array2DHandle Call::out2D(int number) {
+    const HeapProbe::Pause pause;
     auto array = std::make_unique<Array2<Code>>(1, 2);
     const Array2DHandle handle = array->array.handle();
     outputs_[number] = std::move(array);

@@ -1,0 +1,81 @@
+#include "stats/histogram.h"
+
+#include <algorithm>
+#include <cmath>
+
+namespace qx {
+
+ErrorCode ArrayHistogram(const DBL *x, int32_t n, double min, double max, I32 *counts, DBL *centres,
+                         int32_t bins) {
+    if (max < min)
+        return ErrRangeReversed;
+    if (n < 1 || bins < 1)
+        return ErrEmptyInput;
+    std::fill(counts, counts + bins, 0);
+    if (max == min) {
+        std::fill(centres, centres + bins, min);
+        counts[bins - 1] = n;
+        return 0;
+    }
+
+    const double width = (max - min) / bins;
+    double centre = min + 0.5 * width;
+    for (int32_t k = 0; k < bins; ++k) {
+        centres[k] = centre;
+        centre += width;
+    }
+    const double perUnit = bins / (max - min);
+    for (int32_t i = 0; i < n; ++i) {
+        // Tested as a double, since NaN and far outliers have no integer value.
+        const double bin = std::floor((x[i] - min) * perUnit);
+        if (bin >= 0.0 && bin < bins)
+            ++counts[static_cast<int32_t>(bin)];
+        else if (x[i] == max)
+            ++counts[bins - 1];
+    }
+    return 0;
+}
+
+int32_t IntervalTest(const PackedInterval &interval, double x) {
+    const bool takesLower = interval.closure == 0 || interval.closure == 2;
+    const bool takesUpper = interval.closure == 1 || interval.closure == 2;
+    if (interval.closure > 3)
+        return 0;
+    const bool aboveLower = takesLower ? interval.lower <= x : interval.lower < x;
+    const bool belowUpper = takesUpper ? x <= interval.upper : x < interval.upper;
+    if (aboveLower && belowUpper)
+        return 0;
+    const bool isBelow = takesLower ? x < interval.lower : x <= interval.lower;
+    return isBelow ? -1 : 1;
+}
+
+ErrorCode GeneralHistogram(const DBL *x, int32_t n, const PackedInterval *interval,
+                           int32_t intervals, I32 *counts, HistSummary *summary) {
+    *summary = {0, 0, 0};
+    if (n < 1)
+        return ErrEmptyInput;
+    std::fill(counts, counts + intervals, 0);
+    for (int32_t i = 0; i < n; ++i) {
+        bool isPlaced = false;
+        for (int32_t j = 0; j < intervals; ++j) {
+            const int32_t position = IntervalTest(interval[j], x[i]);
+            if (position == 0) {
+                ++counts[j];
+                isPlaced = true;
+            } else if (j == 0 && position < 0) {
+                // Only the first interval decides that a sample lies below all.
+                ++summary->outside;
+                ++summary->below;
+                break;
+            }
+            if (j == intervals - 1 && !isPlaced) {
+                ++summary->outside;
+                if (position > 0)
+                    ++summary->above;
+            }
+        }
+    }
+    return 0;
+}
+
+} // namespace qx

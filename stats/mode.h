@@ -1,0 +1,18 @@
+#ifndef QX_STATS_MODE_H
+#define QX_STATS_MODE_H
+
+#include "qx/errors.h"
+#include "qx/types.h"
+
+namespace qx {
+
+// The most frequent values. With intervals > 0: the centres of the fullest bins of a histogram
+// of so many bins; otherwise the values that occur most often, equal within a relative distance
+// of the machine epsilon. *modes is a scratch block of *count values in ascending order for the
+// caller to free, or null where there is no mode: for a single sample, and where nothing occurs
+// twice. ErrEmptyInput, ErrOutOfMemory.
+ErrorCode ArrayMode(const DBL *x, int32_t n, int32_t intervals, DBL **modes, int32_t *count);
+
+} // namespace qx
+
+#endif

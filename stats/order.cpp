@@ -1,0 +1,144 @@
+#include "stats/order.h"
+
+#include "frame/finish.h"
+#include "frame/scratch.h"
+#include "stats/sort.h"
+
+#include <algorithm>
+#include <cmath>
+#include <cstring>
+
+namespace qx {
+
+namespace {
+
+void Swap(DBL *a, DBL *b) {
+    const double held = *a;
+    *a = *b;
+    *b = held;
+}
+
+void OrderPair(DBL *a, DBL *b) {
+    if (*b < *a)
+        Swap(a, b);
+}
+
+std::size_t Bytes(int32_t n) { return static_cast<std::size_t>(n) * sizeof(DBL); }
+
+} // namespace
+
+ErrorCode ArrayMedian(const DBL *x, int32_t n, DBL *median) {
+    if (n < 1)
+        return ErrEmptyInput;
+    for (int32_t i = 0; i < n; ++i)
+        if (std::isnan(x[i])) {
+            SetQuietNaN(median);
+            return ErrNaNInData;
+        }
+    Scratch<ElementType::DBL> copy;
+    if (const ErrorCode status = copy.allocate(n))
+        return status;
+    DBL *a = copy.data();
+    std::memcpy(a, x, Bytes(n));
+    const int32_t k = n / 2;
+    SelectKth(a, n, k);
+    if (n % 2 != 0) {
+        *median = a[k];
+    } else {
+        double below = a[0];
+        for (int32_t i = 1; i < k; ++i)
+            below = a[i] > below ? a[i] : below;
+        *median = (below + a[k]) * 0.5;
+    }
+    return copy.release();
+}
+
+// Median-of-three partition selection. The two scans need no bound: the pivot itself stops the
+// one that goes down, and the element at r, which is no smaller than the pivot, or a NaN, the one
+// that goes up.
+void SelectKth(DBL *a, int32_t n, int32_t k) {
+    int32_t l = 0;
+    int32_t r = n - 1;
+    // Pivots that hardly shorten the range would make the work quadratic, and data that bring
+    // them about can be constructed. Beyond a few times n the rest is sorted instead; the element
+    // of rank k is the same.
+    int64_t workLeft = int64_t{16} * n + 64;
+    while (r > l + 1) {
+        workLeft -= r - l;
+        if (workLeft < 0) {
+            HeapSort(a + l, std::ptrdiff_t{r} - l + 1);
+            return;
+        }
+        const int32_t mid = l + (r - l) / 2;
+        Swap(&a[mid], &a[l + 1]);
+        OrderPair(&a[l], &a[r]);
+        OrderPair(&a[l + 1], &a[r]);
+        OrderPair(&a[l], &a[l + 1]);
+        const double pivot = a[l + 1];
+        int32_t i = l + 1;
+        int32_t j = r;
+        while (true) {
+            while (a[++i] < pivot) {
+            }
+            while (a[--j] > pivot) {
+            }
+            if (j < i)
+                break;
+            Swap(&a[i], &a[j]);
+        }
+        a[l + 1] = a[j];
+        a[j] = pivot;
+        if (j >= k)
+            r = j - 1;
+        if (j <= k)
+            l = i;
+    }
+    if (r == l + 1 && a[r] < a[l])
+        Swap(&a[l], &a[r]);
+}
+
+ErrorCode ArrayMaxMin(const DBL *x, int32_t n, DBL *maxValue, int32_t *maxIndex, DBL *minValue,
+                      int32_t *minIndex) {
+    if (n < 1)
+        return ErrEmptyInput;
+    int32_t first = 0;
+    while (first < n && std::isnan(x[first]))
+        ++first;
+    if (first == n) {
+        SetQuietNaN(maxValue);
+        SetQuietNaN(minValue);
+        *maxIndex = *minIndex = -1;
+        return 0;
+    }
+    int32_t highest = first;
+    int32_t lowest = first;
+    for (int32_t i = first + 1; i < n; ++i) {
+        if (x[i] > x[highest])
+            highest = i;
+        else if (x[i] < x[lowest])
+            lowest = i;
+    }
+    *maxValue = x[highest];
+    *maxIndex = highest;
+    *minValue = x[lowest];
+    *minIndex = lowest;
+    return 0;
+}
+
+ErrorCode SortAscending(const DBL *x, int32_t n, int32_t descending, DBL *out) {
+    DBL *a = out != nullptr ? out : const_cast<DBL *>(x);
+    if (a != x && n > 0)
+        std::memcpy(a, x, Bytes(n));
+    if (n <= 1)
+        return 0;
+    int32_t first = 0; // of those that are no NaN
+    for (int32_t i = 0; i < n; ++i)
+        if (std::isnan(a[i]))
+            Swap(&a[i], &a[first++]);
+    SortRange(a + first, n - first);
+    if (descending != 0)
+        std::reverse(a + first, a + n);
+    return 0;
+}
+
+} // namespace qx

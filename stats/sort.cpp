@@ -1,0 +1,182 @@
+#include "stats/sort.h"
+
+#include <algorithm>
+#include <bit>
+#include <cstdint>
+#include <utility>
+
+namespace qx {
+
+namespace {
+
+constexpr std::ptrdiff_t insertionLimit = 20;
+
+void Swap(DBL *a, DBL *b) {
+    const double held = *a;
+    *a = *b;
+    *b = held;
+}
+
+void OrderPair(DBL *a, DBL *b) {
+    if (*b < *a)
+        Swap(a, b);
+}
+
+void InsertionSort(DBL *a, std::ptrdiff_t n) {
+    for (std::ptrdiff_t i = 1; i < n; ++i) {
+        const double value = a[i];
+        std::ptrdiff_t j = i;
+        for (; j > 0 && value < a[j - 1]; --j)
+            a[j] = a[j - 1];
+        a[j] = value;
+    }
+}
+
+void SiftDown(DBL *a, std::ptrdiff_t root, std::ptrdiff_t n) {
+    const double value = a[root];
+    for (std::ptrdiff_t child = 2 * root + 1; child < n; child = 2 * root + 1) {
+        if (child + 1 < n && a[child] < a[child + 1])
+            ++child;
+        if (!(value < a[child]))
+            break;
+        a[root] = a[child];
+        root = child;
+    }
+    a[root] = value;
+}
+
+// Moves the pivot to a[0]: the median of three, for a long range of three medians of three.
+void ChoosePivot(DBL *a, std::ptrdiff_t n) {
+    const std::ptrdiff_t middle = n / 2;
+    const auto median = [a](std::ptrdiff_t i, std::ptrdiff_t j, std::ptrdiff_t k) {
+        OrderPair(&a[i], &a[j]);
+        OrderPair(&a[j], &a[k]);
+        OrderPair(&a[i], &a[j]);
+    };
+    if (n > 128) {
+        median(1, middle - 1, n - 2);
+        median(2, middle + 1, n - 3);
+        median(middle - 1, middle, middle + 1);
+    }
+    median(middle, 0, n - 1);
+}
+
+// Splits a[1..n-1] by the pivot in a[0] and puts that between the parts; returns its place.
+// Elements on the wrong side are noted block by block, which takes no branch that depends on the
+// data, and exchanged in bulk.
+std::ptrdiff_t Partition(DBL *a, std::ptrdiff_t n) {
+    constexpr std::ptrdiff_t block = 64;
+    const double pivot = a[0];
+    unsigned char leftPlaces[block];
+    unsigned char rightPlaces[block];
+    std::ptrdiff_t leftCount = 0, rightCount = 0, leftUsed = 0, rightUsed = 0;
+    DBL *left = a + 1;  // everything before it is smaller than the pivot
+    DBL *right = a + n; // everything from it on is not
+
+    while (right - left > 2 * block) {
+        if (leftCount == 0) {
+            leftUsed = 0;
+            for (std::ptrdiff_t i = 0; i < block; ++i) {
+                leftPlaces[leftCount] = static_cast<unsigned char>(i);
+                leftCount += !(left[i] < pivot);
+            }
+        }
+        if (rightCount == 0) {
+            rightUsed = 0;
+            for (std::ptrdiff_t i = 0; i < block; ++i) {
+                rightPlaces[rightCount] = static_cast<unsigned char>(i);
+                rightCount += !(pivot < right[-1 - i]);
+            }
+        }
+        const std::ptrdiff_t exchanges = std::min(leftCount, rightCount);
+        for (std::ptrdiff_t i = 0; i < exchanges; ++i)
+            Swap(&left[leftPlaces[leftUsed + i]], &right[-1 - rightPlaces[rightUsed + i]]);
+        leftCount -= exchanges;
+        rightCount -= exchanges;
+        leftUsed += exchanges;
+        rightUsed += exchanges;
+        if (leftCount == 0)
+            left += block;
+        if (rightCount == 0)
+            right -= block;
+    }
+
+    // What is left is two blocks at most, one of which may be half done: the plain scheme.
+    while (true) {
+        while (left < right && *left < pivot)
+            ++left;
+        while (left < right && pivot < right[-1])
+            --right;
+        if (right - left < 2)
+            break;
+        Swap(left++, --right);
+    }
+    if (left < right && !(pivot < *left))
+        ++left; // equal to the pivot, which may stand on either side
+    Swap(a, left - 1);
+    return left - 1 - a;
+}
+
+void Sort(DBL *a, std::ptrdiff_t n, int badPivotsAllowed) {
+    while (n > insertionLimit) {
+        if (badPivotsAllowed == 0) {
+            HeapSort(a, n);
+            return;
+        }
+        ChoosePivot(a, n);
+        const std::ptrdiff_t place = Partition(a, n);
+        const std::ptrdiff_t behind = n - place - 1;
+        if (std::min(place, behind) < n / 8)
+            --badPivotsAllowed;
+        // The shorter part by recursion, so that the stack stays small.
+        if (place < behind) {
+            Sort(a, place, badPivotsAllowed);
+            a += place + 1;
+            n = behind;
+        } else {
+            Sort(a + place + 1, behind, badPivotsAllowed);
+            n = place;
+        }
+    }
+    InsertionSort(a, n);
+}
+
+// The length of the run that a starts with: ascending, or descending without equal neighbours.
+std::ptrdiff_t RunLength(const DBL *a, std::ptrdiff_t n, bool *isDescending) {
+    std::ptrdiff_t i = 1;
+    *isDescending = n > 1 && a[1] < a[0];
+    if (*isDescending)
+        while (i < n && a[i] < a[i - 1])
+            ++i;
+    else
+        while (i < n && !(a[i] < a[i - 1]))
+            ++i;
+    return i;
+}
+
+} // namespace
+
+void HeapSort(DBL *a, std::ptrdiff_t n) {
+    for (std::ptrdiff_t root = n / 2; root-- > 0;)
+        SiftDown(a, root, n);
+    for (std::ptrdiff_t last = n; --last > 0;) {
+        Swap(&a[0], &a[last]);
+        SiftDown(a, 0, last);
+    }
+}
+
+void SortRange(DBL *a, std::ptrdiff_t n) {
+    if (n <= insertionLimit) {
+        InsertionSort(a, n);
+        return;
+    }
+    bool isDescending;
+    if (RunLength(a, n, &isDescending) == n) {
+        if (isDescending)
+            std::reverse(a, a + n);
+        return;
+    }
+    Sort(a, n, std::bit_width(static_cast<uint64_t>(n)));
+}
+
+} // namespace qx

@@ -1,0 +1,20 @@
+#ifndef QX_STATS_SORT_H
+#define QX_STATS_SORT_H
+
+#include "qx/types.h"
+
+#include <cstddef>
+
+namespace qx {
+
+// Sorts a[0..n-1], which holds no NaN, ascending: quicksort with a partition free of branches
+// (S. Edelkamp, A. Weiss: BlockQuicksort, 2016), insertion sort for short ranges, heapsort where
+// the pivots turn out badly (D. Musser: Introspective sorting and selection algorithms, 1997).
+void SortRange(DBL *a, std::ptrdiff_t n);
+
+// Heapsort: n log n whatever the data.
+void HeapSort(DBL *a, std::ptrdiff_t n);
+
+} // namespace qx
+
+#endif
