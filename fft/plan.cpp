@@ -218,6 +218,7 @@ void Dismantle(FFTPlan *plan) {
         Release(stage->raderPlan);
         std::free(stage);
     }
+    std::free(plan->quarterWave);
     std::free(plan);
 }
 

@@ -44,7 +44,8 @@ struct FFTStage {
     int32_t *raderGather, *raderScatter;
 };
 
-// Everything that a transform of one length needs. Read-only from its creation to its release.
+// Everything that a transform of one length needs. Read-only from its creation to its release,
+// apart from the last field, which is set once.
 struct FFTPlan {
     static constexpr int32_t maxFactors = 20; // no int32 length has more
 
@@ -59,6 +60,9 @@ struct FFTPlan {
     qx::ComplexLeaf complexLeaf[maxFactors];
     qx::ComplexTwiddle complexTwiddle[maxFactors];
     FFTPlan *prev, *next; // the cache
+
+    // Twiddles of the cosine transforms, built by QuarterWave at its first call; else null.
+    mutable DBL *quarterWave;
 };
 
 namespace qx {

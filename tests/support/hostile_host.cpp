@@ -117,6 +117,8 @@ void RunSweeps() {
 }
 
 void RunSweepOf(void *argument) {
+    if (argument == nullptr) // no object's: that is the workspace
+        return;
     SweepProcedure sweep = nullptr;
     {
         const HeapProbe::Pause pause;

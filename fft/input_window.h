@@ -1,0 +1,42 @@
+#ifndef QX_FFT_INPUT_WINDOW_H
+#define QX_FFT_INPUT_WINDOW_H
+
+#include "frame/scratch.h"
+
+#include <cstdint>
+
+namespace qx {
+
+// The `size` values of an input that a transform reads from `offset` on: the input itself where
+// it reaches far enough, else a scratch copy with zeros behind the input's end. The offset must
+// not be negative.
+template <ElementType Code>
+class InputWindow {
+public:
+    typedef typename Element<Code>::type T;
+
+    ErrorCode take(const T *in, int32_t n, int32_t offset, int32_t size) {
+        const int64_t present = int64_t{n} - offset;
+        if (present >= size) {
+            data_ = in + offset;
+            return 0;
+        }
+        if (const ErrorCode failed = copy_.allocate(size))
+            return failed;
+        for (int32_t j = 0; j < size; ++j)
+            copy_[j] = j < present ? in[int64_t{offset} + j] : T{};
+        data_ = copy_.data();
+        return 0;
+    }
+
+    const T *data() const { return data_; }
+    ErrorCode release() { return copy_.release(); }
+
+private:
+    const T *data_ = nullptr;
+    Scratch<Code> copy_;
+};
+
+} // namespace qx
+
+#endif

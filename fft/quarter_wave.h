@@ -1,0 +1,16 @@
+#ifndef QX_FFT_QUARTER_WAVE_H
+#define QX_FFT_QUARTER_WAVE_H
+
+#include "fft/plan.h"
+#include "qx/types.h"
+
+namespace qx {
+
+// The pairs cos, sin of pi k / (2 N) for k from 0 to N/2, with N the plan's length: the twiddles
+// of the cosine transforms. They are built at the plan's first use in such a transform and live
+// as long as the plan. Null if memory ran out. Safe to call from any number of threads.
+const DBL *QuarterWave(const FFTPlan *plan);
+
+} // namespace qx
+
+#endif

@@ -1,0 +1,289 @@
+#include "fft/two_dimensional.h"
+
+#include "fft/column_block.h"
+#include "fft/shifted_order.h"
+#include "frame/heap_block.h"
+
+#include <algorithm>
+#include <cstddef>
+#include <cstring>
+
+namespace qx {
+namespace {
+
+typedef HeapBlock<ElementType::CDB> ComplexBlock;
+
+ErrorCode Forward(const FFTPlan *plan, const CDB *in, CDB *out, int32_t n) {
+    return FFTComplexForward(plan, &in->re, &in->im, &out->re, &out->im, 2, 2, n);
+}
+
+ErrorCode Inverse(const FFTPlan *plan, const CDB *in, CDB *out, int32_t n) {
+    return FFTComplexInverse(plan, &in->re, &in->im, &out->re, &out->im, 2, 2, n);
+}
+
+void CopyElements(const CDB *from, int64_t count, CDB *to) {
+    std::memcpy(to, from, static_cast<std::size_t>(count) * sizeof(CDB));
+}
+
+// The index at which an axis of n values holds frequency f, for f from 0 to n-1.
+int32_t IndexOf(int32_t f, int32_t n, int32_t shift) {
+    if (shift == 0)
+        return f;
+    const int32_t back = n - n / 2;
+    return f < back ? f + n / 2 : f - back;
+}
+
+// The index of the opposite frequency.
+int32_t OppositeOf(int32_t index, int32_t n, int32_t shift) {
+    if (shift != 0 && n % 2 != 0)
+        return n - 1 - index;
+    return index == 0 ? 0 : n - index;
+}
+
+bool StartsBelowZero(const MatrixRegion &region) {
+    return region.rowStart < 0 || region.colStart < 0;
+}
+
+int32_t RowsTaken(const MatrixRegion &region) {
+    return std::min(region.rows, region.matrixRows - region.rowStart);
+}
+
+// The rows of a region, each padded with zeros where the matrix ends before.
+template <ElementType Code>
+class RegionRows {
+public:
+    typedef typename Element<Code>::type T;
+
+    RegionRows(const T *matrix, const MatrixRegion &region) : matrix_(matrix), region_(region) {}
+
+    ErrorCode prepare() {
+        return present() < region_.cols ? padded_.allocateCleared(region_.cols) : 0;
+    }
+    const T *row(int32_t r) const {
+        const T *const start =
+            matrix_ + (int64_t{region_.rowStart} + r) * region_.matrixCols + region_.colStart;
+        if (!padded_.data())
+            return start;
+        std::memcpy(padded_.data(), start, static_cast<std::size_t>(present()) * sizeof(T));
+        return padded_.data();
+    }
+
+private:
+    int32_t present() const { return region_.matrixCols - region_.colStart; }
+
+    const T *matrix_;
+    MatrixRegion region_;
+    HeapBlock<Code> padded_;
+};
+
+// The columns in work, which is row-major with `usedRows` rows of `cols` values, padded with
+// zeros to `rows`, transformed into the columns of out.
+ErrorCode ForwardColumns(const FFTPlan *plan, const CDB *work, int32_t usedRows, int32_t rows,
+                         int32_t cols, int32_t shift, CDB *out, int64_t outPitch) {
+    const int64_t pitch = ColumnPitch(rows);
+    ComplexBlock columns;
+    ComplexBlock results;
+    if (const ErrorCode failed = columns.allocateCleared(ColumnsAtOnce * pitch))
+        return failed;
+    if (const ErrorCode failed = results.allocate(ColumnsAtOnce * pitch))
+        return failed;
+    const int32_t front = rows - IndexOf(0, rows, shift);
+    for (int32_t c = 0; c < cols; c += ColumnsAtOnce) {
+        const int32_t count = ColumnsInBlock(c, cols);
+        GatherColumns<ElementType::CDB>(work + c, cols, usedRows, count, columns.data(), pitch);
+        for (int32_t i = 0; i < count; ++i)
+            if (const ErrorCode failed =
+                    Forward(plan, columns.data() + i * pitch, results.data() + i * pitch, rows))
+                return failed;
+        ScatterColumns<ElementType::CDB>(results.data(), pitch, front, count,
+                                         out + c + (rows - front) * outPitch, outPitch);
+        ScatterColumns<ElementType::CDB>(results.data() + front, pitch, rows - front, count,
+                                         out + c, outPitch);
+    }
+    return 0;
+}
+
+// The first n/2 + 1 values, in plain or in shifted order, of the spectrum whose half-complex
+// form is h.
+void KeepHalf(const DBL *h, int32_t n, int32_t shift, CDB *kept) {
+    const std::ptrdiff_t half = n / 2;
+    for (std::ptrdiff_t k = 1; k <= (n - 1) / 2; ++k)
+        kept[shift == 0 ? k : half - k] = CDB{h[k], shift == 0 ? h[n - k] : -h[n - k]};
+    kept[shift == 0 ? 0 : half] = CDB{h[0], 0};
+    if (n % 2 == 0)
+        kept[shift == 0 ? half : 0] = CDB{h[half], 0};
+}
+
+// The values right of the first cols/2 + 1 are the conjugates of those of opposite frequency.
+void FillBySymmetry(CDB *out, int32_t rows, int32_t cols, int32_t shift) {
+    for (int32_t r = 0; r < rows; ++r) {
+        CDB *const row = out + int64_t{r} * cols;
+        const CDB *const opposite = out + int64_t{OppositeOf(r, rows, shift)} * cols;
+        for (int32_t c = cols / 2 + 1; c < cols; ++c) {
+            const CDB &value = opposite[OppositeOf(c, cols, shift)];
+            row[c] = CDB{value.re, -value.im};
+        }
+    }
+}
+
+// The inverse transforms of the rows of frequencies 0 to count - 1, in this order, into work.
+ErrorCode InverseRows(const FFTPlan *plan, const CDB *in, int32_t rows, int32_t cols, int32_t shift,
+                      int32_t count, CDB *work) {
+    ComplexBlock plain;
+    if (shift != 0)
+        if (const ErrorCode failed = plain.allocate(cols))
+            return failed;
+    for (int32_t f = 0; f < count; ++f) {
+        const CDB *row = in + int64_t{IndexOf(f, rows, shift)} * cols;
+        if (shift != 0) {
+            RotateFromShifted(row, cols, plain.data());
+            row = plain.data();
+        }
+        if (const ErrorCode failed = Inverse(plan, row, work + int64_t{f} * cols, cols))
+            return failed;
+    }
+    return 0;
+}
+
+// `count` columns of spectra of real data, frequencies 0 to n/2 from the top, in half-complex
+// form.
+void GatherHalfComplex(const CDB *work, int64_t workPitch, int32_t n, int32_t count, DBL *columns,
+                       int64_t pitch) {
+    for (int32_t f = 0; f <= n / 2; ++f) {
+        const CDB *const row = work + f * workPitch;
+        const bool hasImaginary = f > 0 && f <= (n - 1) / 2;
+        for (int32_t c = 0; c < count; ++c) {
+            columns[c * pitch + f] = row[c].re;
+            if (hasImaginary)
+                columns[c * pitch + n - f] = row[c].im;
+        }
+    }
+}
+
+// Runs transform(i) for the columns i of a block in ascending order; the number that came out.
+template <class Transform>
+int32_t ColumnsDone(int32_t count, Transform transform) {
+    for (int32_t i = 0; i < count; ++i)
+        if (transform(i) < 0)
+            return i;
+    return count;
+}
+
+} // namespace
+
+ErrorCode FFT2DComplexForward(const FFTPlan *rowPlan, const FFTPlan *columnPlan, const CDB *in,
+                              const MatrixRegion &region, int32_t shift, CDB *out) {
+    if (StartsBelowZero(region))
+        return ErrIndexOutOfRange;
+    const int32_t cols = region.cols;
+    const int32_t used = RowsTaken(region);
+    ComplexBlock work;
+    ComplexBlock spectrum;
+    if (const ErrorCode failed = work.allocate(int64_t{used} * cols))
+        return failed;
+    if (const ErrorCode failed = spectrum.allocate(cols))
+        return failed;
+    RegionRows<ElementType::CDB> rows(in, region);
+    if (const ErrorCode failed = rows.prepare())
+        return failed;
+    const int32_t back = cols / 2;
+    for (int32_t r = 0; r < used; ++r) {
+        CDB *const row = work.data() + int64_t{r} * cols;
+        CDB *const target = shift == 0 ? row : spectrum.data();
+        if (const ErrorCode failed = Forward(rowPlan, rows.row(r), target, cols))
+            return failed;
+        if (shift != 0) {
+            CopyElements(target + (cols - back), back, row);
+            CopyElements(target, cols - back, row + back);
+        }
+    }
+    return ForwardColumns(columnPlan, work.data(), used, region.rows, cols, shift, out, cols);
+}
+
+ErrorCode FFT2DRealForward(const FFTPlan *rowPlan, const FFTPlan *columnPlan, const DBL *in,
+                           const MatrixRegion &region, int32_t shift, CDB *out) {
+    if (StartsBelowZero(region))
+        return ErrIndexOutOfRange;
+    const int32_t cols = region.cols;
+    const int32_t kept = cols / 2 + 1;
+    const int32_t used = RowsTaken(region);
+    ComplexBlock work;
+    HeapBlock<ElementType::DBL> half;
+    if (const ErrorCode failed = work.allocate(int64_t{used} * kept))
+        return failed;
+    if (const ErrorCode failed = half.allocate(cols))
+        return failed;
+    RegionRows<ElementType::DBL> rows(in, region);
+    if (const ErrorCode failed = rows.prepare())
+        return failed;
+    for (int32_t r = 0; r < used; ++r) {
+        if (const ErrorCode failed = FFTRealForward(rowPlan, rows.row(r), half.data(), 1, 1, cols))
+            return failed;
+        KeepHalf(half.data(), cols, shift, work.data() + int64_t{r} * kept);
+    }
+    if (const ErrorCode failed =
+            ForwardColumns(columnPlan, work.data(), used, region.rows, kept, shift, out, cols))
+        return failed;
+    FillBySymmetry(out, region.rows, cols, shift);
+    return 0;
+}
+
+// kept: in both inverses a failed column ends the loop unreported, and the columns from there on
+// stay unwritten.
+
+ErrorCode FFT2DComplexInverse(const FFTPlan *rowPlan, const FFTPlan *columnPlan, const CDB *in,
+                              int32_t rows, int32_t cols, int32_t shift, CDB *out) {
+    const int64_t pitch = ColumnPitch(rows);
+    ComplexBlock work;
+    ComplexBlock columns;
+    ComplexBlock results;
+    if (const ErrorCode failed = work.allocate(int64_t{rows} * cols))
+        return failed;
+    if (const ErrorCode failed = columns.allocate(ColumnsAtOnce * pitch))
+        return failed;
+    if (const ErrorCode failed = results.allocate(ColumnsAtOnce * pitch))
+        return failed;
+    if (const ErrorCode failed = InverseRows(rowPlan, in, rows, cols, shift, rows, work.data()))
+        return failed;
+    int32_t done = ColumnsAtOnce;
+    for (int32_t c = 0; c < cols && done == ColumnsAtOnce; c += ColumnsAtOnce) {
+        const int32_t count = ColumnsInBlock(c, cols);
+        GatherColumns<ElementType::CDB>(work.data() + c, cols, rows, count, columns.data(), pitch);
+        done = ColumnsDone(count, [&](int32_t i) {
+            return Inverse(columnPlan, columns.data() + i * pitch, results.data() + i * pitch,
+                           rows);
+        });
+        ScatterColumns<ElementType::CDB>(results.data(), pitch, rows, done, out + c, cols);
+    }
+    return 0;
+}
+
+ErrorCode FFT2DRealInverse(const FFTPlan *rowPlan, const FFTPlan *columnPlan, const CDB *in,
+                           int32_t rows, int32_t cols, int32_t shift, DBL *out) {
+    const int64_t pitch = ColumnPitch(rows);
+    ComplexBlock work;
+    HeapBlock<ElementType::DBL> columns;
+    HeapBlock<ElementType::DBL> results;
+    const int32_t used = rows / 2 + 1;
+    if (const ErrorCode failed = work.allocate(int64_t{used} * cols))
+        return failed;
+    if (const ErrorCode failed = columns.allocate(ColumnsAtOnce * pitch))
+        return failed;
+    if (const ErrorCode failed = results.allocate(ColumnsAtOnce * pitch))
+        return failed;
+    if (const ErrorCode failed = InverseRows(rowPlan, in, rows, cols, shift, used, work.data()))
+        return failed;
+    int32_t done = ColumnsAtOnce;
+    for (int32_t c = 0; c < cols && done == ColumnsAtOnce; c += ColumnsAtOnce) {
+        const int32_t count = ColumnsInBlock(c, cols);
+        GatherHalfComplex(work.data() + c, cols, rows, count, columns.data(), pitch);
+        done = ColumnsDone(count, [&](int32_t i) {
+            return FFTRealInverse(columnPlan, columns.data() + i * pitch,
+                                  results.data() + i * pitch, 1, 1, rows);
+        });
+        ScatterColumns<ElementType::DBL>(results.data(), pitch, rows, done, out + c, cols);
+    }
+    return 0;
+}
+
+} // namespace qx
