@@ -1,0 +1,154 @@
+#include "transforms/dct.h"
+
+#include "fft/quarter_wave.h"
+#include "transforms/strided_window.h"
+
+#include <cmath>
+#include <cstddef>
+
+namespace qx {
+namespace {
+
+// Below, (c, s) stands for cos and sin of pi k / (2n); those of n - k are (s, c), so bins k and
+// n - k share one pair.
+
+ErrorCode ForwardEven(const FFTPlan *plan, const DBL *x, std::ptrdiff_t inStride, DBL *out,
+                      std::ptrdiff_t outStride, int32_t n, DBL *work) {
+    DBL *const reordered = work;
+    DBL *const h = work + n;
+    for (std::ptrdiff_t j = 0; j < n / 2; ++j) {
+        reordered[j] = x[2 * j * inStride];
+        reordered[n - 1 - j] = x[(2 * j + 1) * inStride];
+    }
+    if (const ErrorCode failed = FFTRealForward(plan, reordered, h, 1, 1, n))
+        return failed;
+    const DBL *const wave = QuarterWave(plan);
+    if (!wave)
+        return ErrOutOfMemory;
+
+    const double scale = 2.0 / std::sqrt(2.0 * n);
+    out[0] = h[0] / std::sqrt(static_cast<double>(n));
+    for (std::ptrdiff_t k = 1; k < n / 2; ++k) {
+        const double c = wave[2 * k];
+        const double s = wave[2 * k + 1];
+        const double re = h[k];
+        const double im = h[n - k];
+        out[k * outStride] = (re * c + im * s) * scale;
+        out[(n - k) * outStride] = (re * s - im * c) * scale;
+    }
+    out[n / 2 * outStride] = h[n / 2] * wave[n] * scale;
+    return 0;
+}
+
+ErrorCode ForwardOdd(const FFTPlan *plan, const DBL *x, std::ptrdiff_t inStride, DBL *out,
+                     std::ptrdiff_t outStride, int32_t n, DBL *work) {
+    const std::ptrdiff_t length = 2 * std::ptrdiff_t{n};
+    DBL *const mirrored = work;
+    DBL *const h = work + length;
+    for (std::ptrdiff_t j = 0; j < n; ++j)
+        mirrored[j] = mirrored[length - 1 - j] = x[j * inStride];
+    if (const ErrorCode failed =
+            FFTRealForward(plan, mirrored, h, 1, 1, static_cast<int32_t>(length)))
+        return failed;
+    const DBL *const wave = QuarterWave(plan);
+    if (!wave)
+        return ErrOutOfMemory;
+
+    const double scale = 1.0 / std::sqrt(2.0 * n);
+    out[0] = 0.5 * h[0] / std::sqrt(static_cast<double>(n));
+    for (std::ptrdiff_t k = 1; k <= n / 2; ++k) {
+        const double c = wave[4 * k];
+        const double s = wave[4 * k + 1];
+        out[k * outStride] = (h[k] * c + h[length - k] * s) * scale;
+        out[(n - k) * outStride] = (h[n - k] * s + h[n + k] * c) * scale;
+    }
+    return 0;
+}
+
+ErrorCode InverseEven(const DBL *spectrum, std::ptrdiff_t inStride, DBL *out,
+                      std::ptrdiff_t outStride, int32_t n, DBL *work, const FFTPlan *plan) {
+    const DBL *const wave = QuarterWave(plan);
+    if (!wave)
+        return ErrOutOfMemory;
+    const std::ptrdiff_t length = n;
+    DBL *const re = work;
+    DBL *const im = work + length;
+    DBL *const u = work + 2 * length;
+    const double scale = std::sqrt(2.0 * n);
+    re[0] = spectrum[0] * std::sqrt(static_cast<double>(n));
+    im[0] = 0;
+    for (std::ptrdiff_t k = 1; k <= n / 2; ++k) {
+        const double c = wave[2 * k] * scale;
+        const double s = wave[2 * k + 1] * scale;
+        const double low = spectrum[k * inStride];
+        const double high = spectrum[(n - k) * inStride];
+        re[k] = low * c;
+        im[k] = low * s;
+        re[n - k] = high * s;
+        im[n - k] = high * c;
+    }
+    if (const ErrorCode failed = FFTComplexInverse(plan, re, im, u, u + length, 1, 1, n))
+        return failed;
+    for (std::ptrdiff_t j = 0; j < n / 2; ++j) {
+        out[2 * j * outStride] = u[j];
+        out[(2 * j + 1) * outStride] = u[n - 1 - j];
+    }
+    return 0;
+}
+
+ErrorCode InverseOdd(const DBL *spectrum, std::ptrdiff_t inStride, DBL *out,
+                     std::ptrdiff_t outStride, int32_t n, DBL *work, const FFTPlan *plan) {
+    const DBL *const wave = QuarterWave(plan);
+    if (!wave)
+        return ErrOutOfMemory;
+    const std::ptrdiff_t length = 2 * std::ptrdiff_t{n};
+    DBL *const h = work;
+    DBL *const u = work + length;
+    const double scale = std::sqrt(2.0 * n);
+    h[0] = 2.0 * spectrum[0] * std::sqrt(static_cast<double>(n));
+    h[n] = 0;
+    for (std::ptrdiff_t k = 1; k <= n / 2; ++k) {
+        const double c = wave[4 * k] * scale;
+        const double s = wave[4 * k + 1] * scale;
+        const double low = spectrum[k * inStride];
+        const double high = spectrum[(n - k) * inStride];
+        h[k] = low * c;
+        h[length - k] = low * s;
+        h[n - k] = high * s;
+        h[n + k] = high * c;
+    }
+    if (const ErrorCode failed = FFTRealInverse(plan, h, u, 1, 1, static_cast<int32_t>(length)))
+        return failed;
+    for (std::ptrdiff_t j = 0; j < n; ++j)
+        out[j * outStride] = u[j];
+    return 0;
+}
+
+} // namespace
+
+ErrorCode DCTForward(const FFTPlan *plan, const DBL *in, int32_t inCount, DBL *out,
+                     int32_t inStride, int32_t outStride, int32_t n, DBL *work) {
+    if (inCount < 1)
+        return ErrEmptyInput;
+    if (n < 1)
+        return ErrFFTSizeNotPositive;
+    if (plan->length != DCTPlanLength(n))
+        return ErrInternal;
+    StridedWindow x;
+    if (const ErrorCode failed = x.take(in, inCount, inStride, n))
+        return failed;
+    const auto forward = n % 2 == 0 ? ForwardEven : ForwardOdd;
+    return forward(plan, x.data, x.stride, out, outStride, n, work);
+}
+
+ErrorCode DCTInverse(const DBL *in, DBL *out, int32_t inStride, int32_t outStride, int32_t n,
+                     DBL *work, const FFTPlan *plan) {
+    if (n < 1)
+        return ErrEmptyInput;
+    if (plan->length != DCTPlanLength(n))
+        return ErrInternal;
+    const auto inverse = n % 2 == 0 ? InverseEven : InverseOdd;
+    return inverse(in, inStride, out, outStride, n, work, plan);
+}
+
+} // namespace qx

@@ -1,0 +1,160 @@
+#include "fft/plan_slot.h"
+#include "qx/errors.h"
+#include "qx/transforms.h"
+#include "tests/support/heap_probe.h"
+#include "tests/support/hostile_host.h"
+#include "tests/support/transform_reference.h"
+
+#include <gtest/gtest.h>
+
+#include <limits>
+
+namespace {
+
+using namespace qx::test;
+
+constexpr double Rounding = 5e-15;
+
+struct Band {
+    int32_t sections, subLength, start, size;
+};
+
+// The definition, on x cut or padded to the long transform's length.
+template <class Values>
+LongSpectrum Expected(const Values &x, const Band &band) {
+    const int64_t length = int64_t{band.sections} * band.subLength;
+    LongSpectrum out(band.size);
+    for (int32_t i = 0; i < band.size; ++i)
+        for (int64_t u = 0; u < length && u < int64_t(x.size()); ++u)
+            out[i] += ToLong(x[u]) * Turn(-(u * (int64_t{band.start} + i) % length), length);
+    return out;
+}
+
+template <class Array, class Plain, class Twin>
+std::vector<CDB> RunTwins(Plain plain, Twin twin, const Array &a, const Band &band) {
+    const Array b(a.values());
+    CDBArray out, other;
+    Node node;
+    EXPECT_EQ(plain(a.handle(), band.sections, band.subLength, band.start, band.size, out.handle(),
+                    &node.slot),
+              0);
+    EXPECT_EQ(twin(b.handle(), band.sections, band.subLength, band.start, band.size, other.handle(),
+                   &node.instance),
+              0);
+    EXPECT_TRUE(SameBits(out.values(), other.values()));
+    EXPECT_TRUE(SameBits(a.values(), b.values()));
+    return out.values();
+}
+
+TEST(BandTransform, GivesBinsOfTheLongTransform) {
+    const Band bands[] = {{1, 8, 3, 5},  {4, 8, 0, 32}, {4, 8, 5, 11},   {3, 7, -2, 30},
+                          {5, 1, -9, 4}, {2, 53, 7, 9}, {6, 5, 1000, 3}, {7, 2, -1000, 16}};
+    for (const Band &band : bands)
+        for (int32_t missing : {0, 1, 9}) {
+            SCOPED_TRACE(testing::Message() << band.sections << "x" << band.subLength << " from "
+                                            << band.start << " less " << missing);
+            const int32_t n = std::max(1, band.sections * band.subLength - missing);
+            const Signal x = RandomSignal(n);
+            const std::vector<CDB> z = RandomComplex(n);
+            EXPECT_LT(MaxError(RunTwins(ReDZTH, ReDZTH_IDP, DBLArray(x), band), Expected(x, band)),
+                      Rounding);
+            EXPECT_LT(MaxError(RunTwins(CxDZTH, CxDZTH_IDP, CDBArray(z), band), Expected(z, band)),
+                      Rounding);
+        }
+}
+
+// Inputs longer than the transform are folded in place by a walk that begins at index N.
+TEST(BandTransform, FoldsLongInputsFromTheSubLengthOn) {
+    const Band band{2, 3, 0, 6};
+    const DBLArray x{1, 2, 3, 4, 5, 6, 7, 8, 9, 10, 11, 12, 13, 14};
+    Node node;
+    CDBArray out;
+    ASSERT_EQ(ReDZTH(x.handle(), 2, 3, 0, 6, out.handle(), &node.slot), 0);
+    // One whole wrap adds 4, 5, 6, 7, 8, 9, of which the first three stand in the fold's own
+    // range and are read before they change; two elements remain: 10 and 11.
+    const Signal folded{1 + 4 + 10, 2 + 5 + 11, 3 + 6, 4 + 7, 5 + 8, 6 + 9};
+    const Signal values = x.values();
+    EXPECT_EQ(Signal(values.begin(), values.begin() + 6), folded);
+    EXPECT_EQ(Signal(values.begin() + 6, values.end()), (Signal{7, 8, 9, 10, 11, 12, 13, 14}));
+    EXPECT_LT(MaxError(out.values(), Expected(folded, band)), Rounding);
+
+    // With one section the walk is a plain wrap.
+    const Signal longer = RandomSignal(11);
+    Signal wrapped(4);
+    for (int32_t j = 0; j < 11; ++j)
+        wrapped[j % 4] += longer[j];
+    const Band single{1, 4, -1, 4};
+    EXPECT_LT(
+        MaxError(RunTwins(ReDZTH, ReDZTH_IDP, DBLArray(longer), single), Expected(wrapped, single)),
+        Rounding);
+
+    const CDBArray complex(RandomComplex(14));
+    const std::vector<CDB> before = complex.values();
+    ASSERT_EQ(CxDZTH(complex.handle(), 2, 3, 0, 6, out.handle(), &node.slot), 0);
+    EXPECT_EQ(complex[1].im, before[1].im + before[4].im + before[10].im);
+}
+
+TEST(BandTransform, ChecksComeInOrderAndEmptyInputIsNoFailure) {
+    const DBLArray none, x(RandomSignal(4));
+    Node node;
+    const auto run = [&](const DBLArray &in, const Band &band) {
+        CDBArray out(2);
+        const ErrorCode status = ReDZTH(in.handle(), band.sections, band.subLength, band.start,
+                                        band.size, out.handle(), &node.slot);
+        EXPECT_EQ(out.size(), 0);
+        return status;
+    };
+    EXPECT_EQ(run(none, {0, 0, 0, 0}), ErrOrderNotPositive);
+    EXPECT_EQ(run(none, {1, 0, 0, 1}), ErrFFTSizeNotPositive);
+    EXPECT_EQ(run(none, {1, 1, 0, 0}), ErrFFTSizeNotPositive);
+    EXPECT_EQ(run(none, {1, 1, 0, 1}), 0);
+    EXPECT_EQ(node.slot, nullptr);
+    const int32_t most = std::numeric_limits<int32_t>::max();
+    EXPECT_EQ(run(x, {most, 2, 0, 1}), ErrLengthTooLarge);
+    EXPECT_EQ(run(x, {1 << 30, 4, most, 1}), ErrLengthTooLarge) << "2^32, which wraps to 0";
+
+    CDBArray out(2);
+    const int32_t least = std::numeric_limits<int32_t>::min();
+    EXPECT_EQ(ReDZTH(x.handle(), 2, 2, least, 3, out.handle(), &node.slot), 0);
+    EXPECT_EQ(ReDZTH(x.handle(), 2, 2, most, 3, out.handle(), &node.slot), 0);
+    EXPECT_EQ(out.size(), 3);
+}
+
+TEST(BandTransform, AHostThatRefusesIsQuoted) {
+    const DBLArray x(RandomSignal(4));
+    for (int32_t hostStatus : {77, -4242}) {
+        CDBArray out(2);
+        Node node;
+        ResetHost(1, hostStatus);
+        EXPECT_EQ(ReDZTH(x.handle(), 2, 2, 0, 3, out.handle(), &node.slot), hostStatus);
+        ResetHost();
+        EXPECT_NE(node.slot, nullptr);
+        EXPECT_EQ(out.size(), hostStatus < 0 ? 0 : 2) << "only a negative status empties";
+    }
+}
+
+TEST(BandTransform, EveryFailedAllocationEndsCleanly) {
+    if (!HeapProbe::works())
+        GTEST_SKIP();
+    const CDBArray x(RandomComplex(6));
+    for (bool isInstance : {false, true}) {
+        int32_t failAt = 1;
+        for (ErrorCode status = -1; status != 0; ++failAt) {
+            CDBArray out(1);
+            const HeapProbe probe(failAt);
+            {
+                Node node;
+                status = isInstance
+                             ? CxDZTH_IDP(x.handle(), 2, 3, 0, 4, out.handle(), &node.instance)
+                             : CxDZTH(x.handle(), 2, 3, 0, 4, out.handle(), &node.slot);
+                const bool failed = probe.allocations() >= failAt;
+                EXPECT_EQ(status, failed ? ErrOutOfMemory : 0);
+                EXPECT_EQ(out.size(), failed ? 0 : 4);
+            }
+            EXPECT_EQ(probe.liveAllocations(), 0) << failAt;
+        }
+        EXPECT_GT(failAt, 3);
+    }
+}
+
+} // namespace
