@@ -6,7 +6,9 @@
 #include "qx/errors.h"
 #include "qx/fft.h"
 #include "qx/frame.h"
+#include "qx/spectra.h"
 #include "qx/stats.h"
+#include "qx/transforms.h"
 #include "qx/types.h"
 
 #endif

@@ -7,6 +7,9 @@ const std::vector<Recipe> &AllRecipes() {
         std::vector<Recipe> recipes;
         for (const auto &family : {
                  BasicStatisticsRecipes(),
+                 FFTRecipes(),
+                 SpectraRecipes(),
+                 TransformRecipes(),
              })
             recipes.insert(recipes.end(), family.begin(), family.end());
         return recipes;
@@ -22,6 +25,7 @@ const std::vector<Exempt> &ExemptExports() {
         {"UninitializeAnalysisWorkspaceH", "as above"},
         {"create_oxfft_table", "gives a plan; fft/tests"},
         {"destroy_oxfft_table", "takes a plan; fft/tests"},
+        {"TransformUnreserveProc", "releases the nodes of all others; no arrays"},
         {"SetQXRTModule", "changes the process; frame/tests calls it in a process of its own"},
     };
     return exempt;

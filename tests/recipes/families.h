@@ -6,6 +6,9 @@
 namespace qx::test {
 
 std::vector<Recipe> BasicStatisticsRecipes();
+std::vector<Recipe> FFTRecipes();
+std::vector<Recipe> SpectraRecipes();
+std::vector<Recipe> TransformRecipes();
 
 } // namespace qx::test
 
