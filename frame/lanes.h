@@ -1,0 +1,125 @@
+#ifndef QX_FRAME_LANES_H
+#define QX_FRAME_LANES_H
+
+#include "qx/types.h"
+
+#include <cstddef>
+#include <cstring>
+
+// Four lanes without AVX are two registers; that the calling convention for them depends on the
+// instruction set is no matter, since all of it is inlined.
+#pragma GCC diagnostic push
+#pragma GCC diagnostic ignored "-Wpsabi"
+
+namespace qx {
+
+// SIMD over independent elements: Lanes<N> holds N doubles, and every operation does in each lane
+// exactly what it would do to one double. A text written over Lanes thus gives the same bits for
+// every N, and an array may be cut into Lanes<nativeLanes> and a rest of Lanes<1> at will.
+//
+//     template <class L>
+//     void ScaleSome(DBL *x, double factor) { (L::load(x) * L(factor)).store(x); }
+//
+//     for (; i + nativeLanes <= n; i += nativeLanes) ScaleSome<Lanes<nativeLanes>>(x + i, f);
+//     for (; i < n; ++i) ScaleSome<Lanes<1>>(x + i, f);
+//
+// Memory need not be aligned. N is 1, 2 or 4.
+
+// What the instruction set of the build offers.
+#ifdef __AVX__
+inline constexpr int nativeLanes = 4;
+#else
+inline constexpr int nativeLanes = 2;
+#endif
+
+template <int N>
+struct LaneVector;
+template <>
+struct LaneVector<2> {
+    typedef double type __attribute__((vector_size(16)));
+    static type broadcast(double x) { return type{x, x}; }
+};
+template <>
+struct LaneVector<4> {
+    typedef double type __attribute__((vector_size(32)));
+    static type broadcast(double x) { return type{x, x, x, x}; }
+};
+
+template <int N>
+class Lanes {
+public:
+    typedef typename LaneVector<N>::type Vector;
+    static constexpr int count = N;
+
+    Lanes() = default;
+    // The same value in every lane.
+    explicit Lanes(double value) : v(LaneVector<N>::broadcast(value)) {}
+    explicit Lanes(Vector vector) : v(vector) {}
+
+    static Lanes load(const DBL *x) {
+        Lanes lanes;
+        std::memcpy(&lanes.v, x, sizeof lanes.v);
+        return lanes;
+    }
+    void store(DBL *x) const { std::memcpy(x, &v, sizeof v); }
+
+    // Elements 0, stride, 2 stride, ...
+    static Lanes gather(const DBL *x, std::ptrdiff_t stride) {
+        if constexpr (N == 2)
+            return Lanes(Vector{x[0], x[stride]});
+        else
+            return Lanes(Vector{x[0], x[stride], x[2 * stride], x[3 * stride]});
+    }
+    void scatter(DBL *x, std::ptrdiff_t stride) const {
+        for (int i = 0; i < N; ++i)
+            x[i * stride] = v[i];
+    }
+
+    // The lanes in the opposite order.
+    Lanes reversed() const {
+        if constexpr (N == 2)
+            return Lanes(__builtin_shufflevector(v, v, 1, 0));
+        else
+            return Lanes(__builtin_shufflevector(v, v, 3, 2, 1, 0));
+    }
+
+    double operator[](int lane) const { return v[lane]; }
+
+    friend Lanes operator+(Lanes a, Lanes b) { return Lanes(a.v + b.v); }
+    friend Lanes operator-(Lanes a, Lanes b) { return Lanes(a.v - b.v); }
+    friend Lanes operator*(Lanes a, Lanes b) { return Lanes(a.v * b.v); }
+    friend Lanes operator/(Lanes a, Lanes b) { return Lanes(a.v / b.v); }
+    friend Lanes operator-(Lanes a) { return Lanes(-a.v); }
+
+    Vector v;
+};
+
+template <>
+class Lanes<1> {
+public:
+    static constexpr int count = 1;
+
+    Lanes() = default;
+    explicit Lanes(double value) : v(value) {}
+
+    static Lanes load(const DBL *x) { return Lanes(*x); }
+    void store(DBL *x) const { *x = v; }
+    static Lanes gather(const DBL *x, std::ptrdiff_t) { return Lanes(*x); }
+    void scatter(DBL *x, std::ptrdiff_t) const { *x = v; }
+    Lanes reversed() const { return *this; }
+    double operator[](int) const { return v; }
+
+    friend Lanes operator+(Lanes a, Lanes b) { return Lanes(a.v + b.v); }
+    friend Lanes operator-(Lanes a, Lanes b) { return Lanes(a.v - b.v); }
+    friend Lanes operator*(Lanes a, Lanes b) { return Lanes(a.v * b.v); }
+    friend Lanes operator/(Lanes a, Lanes b) { return Lanes(a.v / b.v); }
+    friend Lanes operator-(Lanes a) { return Lanes(-a.v); }
+
+    double v;
+};
+
+} // namespace qx
+
+#pragma GCC diagnostic pop
+
+#endif
