@@ -43,12 +43,16 @@ template <class... Work>
 std::array<double, sizeof...(Work)> MedianTimes(const Work &...contestants) {
     constexpr double runSeconds = 1e-4;
     constexpr int rounds = 25;
+    constexpr double longEnough = 1.0; // long work is content with three rounds
     const std::array<std::size_t, sizeof...(Work)> repeats = {
         RepeatsFor(runSeconds, contestants)...};
     std::array<std::vector<double>, sizeof...(Work)> times;
-    for (int round = 0; round < rounds; ++round) {
+    double taken = 0;
+    for (int round = 0; round < rounds && (round < 3 || taken < longEnough); ++round) {
         std::size_t i = 0;
-        ((times[i].push_back(SecondsOf(repeats[i], contestants) / repeats[i]), ++i), ...);
+        ((times[i].push_back(SecondsOf(repeats[i], contestants) / repeats[i]),
+          taken += times[i].back() * static_cast<double>(repeats[i]), ++i),
+         ...);
     }
     std::array<double, sizeof...(Work)> medians;
     std::transform(times.begin(), times.end(), medians.begin(), Median);

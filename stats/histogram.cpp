@@ -1,7 +1,6 @@
 #include "stats/histogram.h"
 
-#include <algorithm>
-#include <cmath>
+#include <cstring>
 
 namespace qx {
 
@@ -11,9 +10,10 @@ ErrorCode ArrayHistogram(const DBL *x, int32_t n, double min, double max, I32 *c
         return ErrRangeReversed;
     if (n < 1 || bins < 1)
         return ErrEmptyInput;
-    std::fill(counts, counts + bins, 0);
+    std::memset(counts, 0, static_cast<std::size_t>(bins) * sizeof(I32));
     if (max == min) {
-        std::fill(centres, centres + bins, min);
+        for (int32_t k = 0; k < bins; ++k)
+            centres[k] = min;
         counts[bins - 1] = n;
         return 0;
     }
@@ -26,10 +26,11 @@ ErrorCode ArrayHistogram(const DBL *x, int32_t n, double min, double max, I32 *c
     }
     const double perUnit = bins / (max - min);
     for (int32_t i = 0; i < n; ++i) {
-        // Tested as a double, since NaN and far outliers have no integer value.
-        const double bin = std::floor((x[i] - min) * perUnit);
-        if (bin >= 0.0 && bin < bins)
-            ++counts[static_cast<int32_t>(bin)];
+        // Tested as a double, since NaN and far outliers have no integer value. From 0 on the
+        // conversion is the floor.
+        const double position = (x[i] - min) * perUnit;
+        if (position >= 0.0 && position < bins)
+            ++counts[static_cast<int32_t>(position)];
         else if (x[i] == max)
             ++counts[bins - 1];
     }
@@ -54,7 +55,7 @@ ErrorCode GeneralHistogram(const DBL *x, int32_t n, const PackedInterval *interv
     *summary = {0, 0, 0};
     if (n < 1)
         return ErrEmptyInput;
-    std::fill(counts, counts + intervals, 0);
+    std::memset(counts, 0, static_cast<std::size_t>(intervals) * sizeof(I32));
     for (int32_t i = 0; i < n; ++i) {
         bool isPlaced = false;
         for (int32_t j = 0; j < intervals; ++j) {

@@ -1,10 +1,8 @@
 #include "stats/order.h"
 
 #include "frame/finish.h"
-#include "frame/scratch.h"
 #include "stats/sort.h"
 
-#include <algorithm>
 #include <cmath>
 #include <cstring>
 
@@ -23,35 +21,7 @@ void OrderPair(DBL *a, DBL *b) {
         Swap(a, b);
 }
 
-std::size_t Bytes(int32_t n) { return static_cast<std::size_t>(n) * sizeof(DBL); }
-
 } // namespace
-
-ErrorCode ArrayMedian(const DBL *x, int32_t n, DBL *median) {
-    if (n < 1)
-        return ErrEmptyInput;
-    for (int32_t i = 0; i < n; ++i)
-        if (std::isnan(x[i])) {
-            SetQuietNaN(median);
-            return ErrNaNInData;
-        }
-    Scratch<ElementType::DBL> copy;
-    if (const ErrorCode status = copy.allocate(n))
-        return status;
-    DBL *a = copy.data();
-    std::memcpy(a, x, Bytes(n));
-    const int32_t k = n / 2;
-    SelectKth(a, n, k);
-    if (n % 2 != 0) {
-        *median = a[k];
-    } else {
-        double below = a[0];
-        for (int32_t i = 1; i < k; ++i)
-            below = a[i] > below ? a[i] : below;
-        *median = (below + a[k]) * 0.5;
-    }
-    return copy.release();
-}
 
 // Median-of-three partition selection. The two scans need no bound: the pivot itself stops the
 // one that goes down, and the element at r, which is no smaller than the pivot, or a NaN, the one
@@ -127,17 +97,21 @@ ErrorCode ArrayMaxMin(const DBL *x, int32_t n, DBL *maxValue, int32_t *maxIndex,
 
 ErrorCode SortAscending(const DBL *x, int32_t n, int32_t descending, DBL *out) {
     DBL *a = out != nullptr ? out : const_cast<DBL *>(x);
-    if (a != x && n > 0)
-        std::memcpy(a, x, Bytes(n));
-    if (n <= 1)
+    if (n < 1)
         return 0;
+    const bool isAscending = IsAscending(x, n);
+    const bool isDescending = !isAscending && IsDescending(x, n);
+    if (a != x)
+        std::memcpy(a, x, static_cast<std::size_t>(n) * sizeof(DBL));
     int32_t first = 0; // of those that are no NaN
-    for (int32_t i = 0; i < n; ++i)
-        if (std::isnan(a[i]))
-            Swap(&a[i], &a[first++]);
-    SortRange(a + first, n - first);
-    if (descending != 0)
-        std::reverse(a + first, a + n);
+    if (!isAscending && !isDescending) {
+        for (int32_t i = 0; i < n; ++i)
+            if (std::isnan(a[i]))
+                Swap(&a[i], &a[first++]);
+        SortRange(a + first, n - first);
+    }
+    if (isDescending != (descending != 0))
+        Reverse(a + first, n - first);
     return 0;
 }
 

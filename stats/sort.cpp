@@ -141,19 +141,6 @@ void Sort(DBL *a, std::ptrdiff_t n, int badPivotsAllowed) {
     InsertionSort(a, n);
 }
 
-// The length of the run that a starts with: ascending, or descending without equal neighbours.
-std::ptrdiff_t RunLength(const DBL *a, std::ptrdiff_t n, bool *isDescending) {
-    std::ptrdiff_t i = 1;
-    *isDescending = n > 1 && a[1] < a[0];
-    if (*isDescending)
-        while (i < n && a[i] < a[i - 1])
-            ++i;
-    else
-        while (i < n && !(a[i] < a[i - 1]))
-            ++i;
-    return i;
-}
-
 } // namespace
 
 void HeapSort(DBL *a, std::ptrdiff_t n) {
@@ -165,18 +152,25 @@ void HeapSort(DBL *a, std::ptrdiff_t n) {
     }
 }
 
-void SortRange(DBL *a, std::ptrdiff_t n) {
-    if (n <= insertionLimit) {
-        InsertionSort(a, n);
-        return;
-    }
-    bool isDescending;
-    if (RunLength(a, n, &isDescending) == n) {
-        if (isDescending)
-            std::reverse(a, a + n);
-        return;
-    }
-    Sort(a, n, std::bit_width(static_cast<uint64_t>(n)));
+void SortRange(DBL *a, std::ptrdiff_t n) { Sort(a, n, std::bit_width(static_cast<uint64_t>(n))); }
+
+bool IsAscending(const DBL *a, std::ptrdiff_t n) {
+    for (std::ptrdiff_t i = 1; i < n; ++i)
+        if (!(a[i - 1] <= a[i]))
+            return false;
+    return n > 1 || a[0] == a[0];
+}
+
+bool IsDescending(const DBL *a, std::ptrdiff_t n) {
+    for (std::ptrdiff_t i = 1; i < n; ++i)
+        if (!(a[i - 1] >= a[i]))
+            return false;
+    return n > 1 || a[0] == a[0];
+}
+
+void Reverse(DBL *a, std::ptrdiff_t n) {
+    for (std::ptrdiff_t i = 0; i < n - 1 - i; ++i)
+        Swap(&a[i], &a[n - 1 - i]);
 }
 
 } // namespace qx

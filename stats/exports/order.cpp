@@ -6,7 +6,7 @@
 #include "stats/mode.h"
 #include "stats/order.h"
 
-#include <algorithm>
+#include <cstring>
 
 namespace {
 
@@ -29,7 +29,7 @@ ErrorCode ModeH(DBL1D x, int32_t intervals, DBL1D modes) {
     if (status == 0 && count > 0) {
         status = out.resize(count);
         if (status == 0)
-            std::copy(found, found + count, out.data());
+            std::memcpy(out.data(), found, static_cast<std::size_t>(count) * sizeof(DBL));
     }
     status = qx::Merge(status, qx::ScratchFree(found));
     if (status < 0 || count == 0)

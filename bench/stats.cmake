@@ -1,0 +1,1 @@
+qx_bench(stats SOURCES stats.cpp)

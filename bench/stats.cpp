@@ -1,0 +1,185 @@
+// Sorting, selection and the strictly sequential sums.
+//
+// bench_stats [GROUP...]: sort, median, sums; all by default. Peers: std::sort and
+// std::nth_element on a copy, and for the sums the latency limit of their order of summation.
+
+#include "bench/timing.h"
+#include "stats/basic.h"
+#include "stats/order.h"
+
+#include <cstdint>
+#include <cstring>
+#include <memory>
+#include <random>
+
+namespace {
+
+using namespace qx::bench;
+
+// Different arrays of one kind and length, taken in turn, so that the branch predictor does not
+// learn a short one by heart.
+class Pool {
+public:
+    Pool(int32_t n, double (*value)(std::mt19937_64 &, int32_t i, int32_t n))
+        : n_(n), copies_(std::max(1, 65536 / n)) {
+        std::mt19937_64 random(static_cast<uint64_t>(n));
+        for (int32_t copy = 0; copy < copies_; ++copy)
+            for (int32_t i = 0; i < n; ++i)
+                values_.push_back(value(random, i, n));
+    }
+    int32_t size() const { return n_; }
+    const double *next(int &turn) const {
+        turn = turn + 1 < copies_ ? turn + 1 : 0;
+        return values_.data() + static_cast<std::size_t>(turn) * static_cast<std::size_t>(n_);
+    }
+
+private:
+    int32_t n_;
+    int copies_;
+    std::vector<double> values_;
+};
+
+struct Kind {
+    const char *name;
+    double (*value)(std::mt19937_64 &, int32_t i, int32_t n);
+};
+
+double Random(std::mt19937_64 &random, int32_t, int32_t) {
+    return static_cast<double>(random() >> 11);
+}
+
+const Kind kinds[] = {
+    {"random", Random},
+    {"sorted", [](std::mt19937_64 &, int32_t i, int32_t) -> double { return i; }},
+    {"reversed", [](std::mt19937_64 &, int32_t i, int32_t n) -> double { return n - i; }},
+    {"constant", [](std::mt19937_64 &, int32_t, int32_t) { return 3.0; }},
+    {"16 values", [](std::mt19937_64 &r, int32_t, int32_t) -> double { return r() % 16; }},
+    {"rise and fall",
+     [](std::mt19937_64 &, int32_t i, int32_t n) -> double { return std::min(i, n - i); }},
+    {"sorted, 1% random",
+     [](std::mt19937_64 &r, int32_t i, int32_t n) -> double {
+         return r() % 100 == 0 ? r() % static_cast<uint64_t>(n) : static_cast<uint64_t>(i);
+     }},
+};
+
+template <class Ours, class Peer>
+void CompareOnAllKinds(const char *name, const Ours &ours, const Peer &peer) {
+    Ratios all(name);
+    for (const Kind &kind : kinds) {
+        Ratios ratios(std::string(name) + ", " + kind.name);
+        for (const int32_t n : {10, 20, 30, 100, 300, 1000, 10000, 100000, 1000000, 10000000}) {
+            const Pool pool(n, kind.value);
+            std::vector<double> work(static_cast<std::size_t>(n));
+            int ourTurn = 0;
+            int peerTurn = 0;
+            const auto [ourTime, peerTime] =
+                MedianTimes([&] { ours(pool.next(ourTurn), n, work.data()); },
+                            [&] { peer(pool.next(peerTurn), n, work.data()); });
+            std::printf("%-8s %-18s n %9d %12.3f us  ratio %5.2f\n", name, kind.name, n,
+                        ourTime * 1e6, ourTime / peerTime);
+            std::fflush(stdout);
+            ratios.add(ourTime / peerTime);
+            all.add(ourTime / peerTime);
+        }
+        ratios.print();
+    }
+    all.print();
+}
+
+void CopyTo(double *to, const double *from, int32_t n) {
+    std::memcpy(to, from, static_cast<std::size_t>(n) * sizeof(double));
+}
+
+void Sort() {
+    CompareOnAllKinds(
+        "sort",
+        [](const double *x, int32_t n, double *work) {
+            qx::SortAscending(x, n, 0, work);
+            Keep(work[0]);
+        },
+        [](const double *x, int32_t n, double *work) {
+            CopyTo(work, x, n);
+            std::sort(work, work + n);
+            Keep(work[0]);
+        });
+}
+
+// The peer does what a median needs and no more: a copy of its own, but no look for NaN.
+void Median() {
+    CompareOnAllKinds(
+        "median",
+        [](const double *x, int32_t n, double *) {
+            double median;
+            qx::ArrayMedian(x, n, &median);
+            Keep(median);
+        },
+        [](const double *x, int32_t n, double *) {
+            const auto copy = std::make_unique_for_overwrite<double[]>(static_cast<std::size_t>(n));
+            double *work = copy.get();
+            CopyTo(work, x, n);
+            std::nth_element(work, work + n / 2, work + n);
+            double median = work[n / 2];
+            if (n % 2 == 0)
+                median = (median + *std::max_element(work, work + n / 2)) * 0.5;
+            Keep(median);
+        });
+}
+
+// A sum in one accumulator from the first term to the last takes no less than one addition's
+// latency per term. The limit is measured as such a chain whose term stands in a register.
+void AdditionChain(int32_t n, double term) {
+    double sum = 0.0;
+    for (int32_t i = 0; i < n; ++i) {
+        asm volatile("" : "+x"(term));
+        sum += term;
+    }
+    Keep(sum);
+}
+
+void Sums() {
+    Ratios ratios("sums against their latency limit");
+    for (const int32_t n : {1000, 3000, 30000, 1000000, 10000000}) {
+        const Pool x(n, Random);
+        const Pool y(n + 1, Random);
+        int turn = 0;
+        int otherTurn = 0;
+        double result;
+        const auto times =
+            MedianTimes([&] { AdditionChain(n, 1.25); },
+                        [&] {
+                            qx::ArrayMean(x.next(turn), n, &result);
+                            Keep(result);
+                        },
+                        [&] {
+                            qx::ArrayRMS(x.next(turn), n, &result);
+                            Keep(result);
+                        },
+                        [&] {
+                            qx::ArrayMSE(x.next(turn), n, y.next(otherTurn), n, &result);
+                            Keep(result);
+                        });
+        std::printf("sums n %9d  limit %6.3f ns a term; ratios: mean %5.3f  RMS %5.3f  MSE %5.3f\n",
+                    n, times[0] / n * 1e9, times[1] / times[0], times[2] / times[0],
+                    times[3] / times[0]);
+        for (int i = 1; i < 4; ++i)
+            ratios.add(times[i] / times[0]);
+    }
+    ratios.print();
+}
+
+} // namespace
+
+int main(int argc, char **argv) {
+    const auto wanted = [&](const char *group) {
+        return argc < 2 || std::any_of(argv + 1, argv + argc, [&](const char *argument) {
+                   return std::strcmp(argument, group) == 0;
+               });
+    };
+    if (wanted("sums"))
+        Sums();
+    if (wanted("sort"))
+        Sort();
+    if (wanted("median"))
+        Median();
+    return 0;
+}
