@@ -4,6 +4,7 @@ import ctypes
 import difflib
 import functools
 import inspect
+import keyword
 import operator
 import warnings
 
@@ -95,8 +96,8 @@ class Export:
         self.taken = [a for a in self.arguments
                       if a["direction"] != "in" and a["kind"] not in ("slot", "instance", "error")]
         self.has_error = bool(self.arguments) and self.arguments[-1]["kind"] == "error"
-        self.has_arrays = any(a["kind"].startswith("array") for a in self.arguments)
-        self.names = [a["name"] for a in self.given]
+        self.has_plan = any(a["kind"] in ("slot", "instance") for a in self.arguments)
+        self.names = [a["name"] + "_" * keyword.iskeyword(a["name"]) for a in self.given]
         self.gives_value = entry["returns"] not in ("ErrorCode", "void") and not self.has_error
         self.is_scalar = bool(self.given) and all(
             a["kind"] in ("value", "reference", "output", "error") for a in self.arguments)
@@ -108,6 +109,13 @@ class Export:
     @staticmethod
     def _is_given(argument):
         return argument["direction"] != "out" and argument["kind"] not in ("slot", "instance")
+
+    @staticmethod
+    def _length(argument, value):
+        """What the length of a plan may depend on: the shape of an array, a whole number."""
+        if argument["kind"].startswith("array"):
+            return np.shape(value)
+        return value if argument.get("element") == "I32" else None
 
     def signature(self):
         """How the export is called from Python."""
@@ -133,7 +141,7 @@ class Export:
         return self._called(values)
 
     def _called(self, values, place="", warned=None):
-        lengths = tuple(np.shape(value) for value in values) if self.has_arrays else ()
+        lengths = tuple(map(self._length, self.given, values)) if self.has_plan else ()
         values = iter(values)
         c_arguments, kept = [], []
         for argument in self.arguments:
