@@ -28,7 +28,7 @@ typedef void *PlanSlot;
 typedef void *InstanceWord;
 typedef double (*Function)(double x, void *context);
 
-/** One line; ErrEmptyInput, then -20001, then ErrEmptyInput. */
+/** One line; ErrEmptyInput, then -20001, then ErrEmptyInput, 20004 a warning, 20000 points. */
 QX_API ErrorCode Everything(QX_IN DBL1D x, QX_INOUT CDB2D m, QX_IN Interval1D intervals,
                             QX_OUT I32_1D counts, int32_t n, QX_IN const int32_t *order,
                             QX_OUT DBL *value, QX_INOUT DBL *level, QX_INOUT PlanSlot *slot,
@@ -75,7 +75,7 @@ class Reading(unittest.TestCase):
             ("slot", "slot", None, "inout"), ("instance", "instance", None, "inout"),
             ("record", "record", "Interval", "inout"), ("function", "procedure", None, "in"),
             ("err", "error", "I32", "out")])
-        self.assertEqual(everything["codes"], ["ErrEmptyInput", "ErrOutOfMemory"])
+        self.assertEqual(everything["codes"], ["ErrEmptyInput", "ErrOutOfMemory", "WarnLengthsDiffer"])
         self.assertEqual((everything["family"], everything["returns"]), ("shapes", "ErrorCode"))
         self.assertEqual(everything["line"], SHAPES[:SHAPES.index("QX_API ErrorCode")].count("\n") + 1)
         self.assertEqual((make["returns"], make["documentation"]),

@@ -244,13 +244,15 @@ def argument_of(words, types):
 
 
 def raised_codes(documentation, codes):
-    """The codes that a text names, by name or by signed number, in order; and an unknown one."""
-    names = {number: name for name, number in codes.items()}
+    """The codes that a text names, by name or by number, in order; and an unknown one. A number
+    without a sign counts if it is a known warning."""
+    names = {str(number): name for name, number in codes.items()}
     raised = []
-    for word in re.findall(r"\b(?:Err|Warn)[A-Z]\w*|(?<![\w.])[-+]2[0-4]\d{3}(?!\w|\.\d)", documentation):
-        code = names.get(int(word)) if word[0] in "+-" else word
-        if code == "ErrorCode":
+    for word in re.findall(r"\b(?:Err|Warn)[A-Z]\w*|(?<![\w.])[-+]?2[0-4]\d{3}(?!\w|\.\d)",
+                           documentation):
+        if word == "ErrorCode" or (word[0] == "2" and word not in names):
             continue
+        code = word if word[0] in "EW" else names.get(word.lstrip("+"))
         if code not in codes:
             return raised, word
         raised.append(code)

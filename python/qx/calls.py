@@ -1,0 +1,257 @@
+"""Calls of the exports by the catalogue: what goes in, what comes out, what went wrong."""
+
+import ctypes
+import difflib
+import functools
+import inspect
+import keyword
+import operator
+import warnings
+
+import numpy as np
+
+from . import arrays, plans
+from .library import library
+
+C_TYPES = {"I32": ctypes.c_int32, "U8": ctypes.c_uint8, "U32": ctypes.c_uint32,
+           "SGL": ctypes.c_float, "DBL": ctypes.c_double}
+COMPLEX_PARTS = {"CSG": ctypes.c_float, "CDB": ctypes.c_double}
+RESULTS = {"ErrorCode": ctypes.c_int32, "int32_t": ctypes.c_int32, "uint32_t": ctypes.c_uint32,
+           "uint8_t": ctypes.c_uint8, "double": ctypes.c_double, "DBL": ctypes.c_double,
+           "float": ctypes.c_float, "void": None}
+INTEGER_LIMITS = {"I32": (-2**31, 2**31 - 1), "U32": (0, 2**32 - 1), "U8": (0, 255)}
+HOST_FAILURES = (1, 2)  # statuses of the host that some exports pass on
+
+
+class QxError(Exception):
+    """A failure: `code`, `name` and `text` as the host has them, `export`, and `results` with
+    what the export left behind. Most failures leave empty arrays and NaN."""
+
+    def __init__(self, export, code, results=None, place=""):
+        self.export, self.code, self.results = export, code, results
+        self.name, self.text = library().error_name(code), library().error_text(code)
+        super().__init__(f"{export}{place}: {self.text} ({self.name}, {code})")
+
+
+class QxWarning(UserWarning):
+    """A warning: the results stand."""
+
+    def __init__(self, export, code):
+        self.export, self.code = export, code
+        self.name, self.text = library().error_name(code), library().error_text(code)
+        super().__init__(f"{export}: {self.text} ({self.name}, {code})")
+
+
+def scalar(value, element, name):
+    """A number as ctypes takes it, refused where it would lose anything but precision."""
+    if element in COMPLEX_PARTS:
+        value = complex(value)
+        return (COMPLEX_PARTS[element] * 2)(value.real, value.imag)
+    if element in INTEGER_LIMITS:
+        try:
+            number = operator.index(value)
+        except TypeError:
+            if not (isinstance(value, float) and value.is_integer()):
+                raise TypeError(f"{name}: a whole number is needed, not {value!r}") from None
+            number = int(value)
+        lowest, highest = INTEGER_LIMITS[element]
+        if not lowest <= number <= highest:
+            raise ValueError(f"{name}: {number} lies outside {lowest} to {highest}")
+        return C_TYPES[element](number)
+    if isinstance(value, (str, bytes)):
+        raise TypeError(f"{name}: a number is needed, not {value!r}")
+    return C_TYPES[element](value)
+
+
+def plain(c_value, element):
+    if element in COMPLEX_PARTS:
+        return complex(*c_value)
+    return c_value.value
+
+
+@functools.lru_cache(maxsize=None)
+def record_type(name):
+    """The ctypes structure of a record."""
+    description = library().records[name]
+    fields = []
+    for field in description["fields"]:
+        if "element" not in field or "count" in field or field["element"] in COMPLEX_PARTS:
+            raise TypeError(f"records of type {name} hold more than plain numbers")
+        fields.append((field["name"], C_TYPES[field["element"]]))
+    body = {"_fields_": fields}
+    if description["packed"]:
+        body = {"_pack_": 1, **body}
+    return type(name, (ctypes.Structure,), body)
+
+
+class Export:
+    """One export, ready to be called."""
+
+    def __init__(self, entry):
+        self.entry, self.name = entry, entry["name"]
+        self.arguments = entry["arguments"]
+        self.function = getattr(library().module, self.name)
+        self.function.restype = RESULTS.get(entry["returns"], ctypes.c_void_p)
+        self.given = [a for a in self.arguments if self._is_given(a)]
+        self.taken = [a for a in self.arguments
+                      if a["direction"] != "in" and a["kind"] not in ("slot", "instance", "error")]
+        self.has_error = bool(self.arguments) and self.arguments[-1]["kind"] == "error"
+        self.has_plan = any(a["kind"] in ("slot", "instance") for a in self.arguments)
+        self.names = [a["name"] + "_" * keyword.iskeyword(a["name"]) for a in self.given]
+        self.gives_value = entry["returns"] not in ("ErrorCode", "void") and not self.has_error
+        self.is_scalar = bool(self.given) and all(
+            a["kind"] in ("value", "reference", "output", "error") for a in self.arguments)
+        self.is_function = self.gives_value and self.is_scalar and all(
+            a["kind"] == "value" and a["element"] in C_TYPES for a in self.arguments)
+        if self.is_function:
+            self.function.argtypes = [C_TYPES[a["element"]] for a in self.arguments]
+
+    @staticmethod
+    def _is_given(argument):
+        return argument["direction"] != "out" and argument["kind"] not in ("slot", "instance")
+
+    @staticmethod
+    def _length(argument, value):
+        """What the length of a plan may depend on: the shape of an array, a whole number."""
+        if argument["kind"].startswith("array"):
+            return np.shape(value)
+        return value if argument.get("element") == "I32" else None
+
+    def signature(self):
+        """How the export is called from Python."""
+        results = [a["name"] for a in self.taken] or (["value"] if self.gives_value else [])
+        text = ", ".join([f'"{self.name}"', *self.names])
+        return (", ".join(results) + " = " if results else "") + f"qx.call({text})"
+
+    def bind(self, positional, named):
+        """The given values in the order of the arguments."""
+        if not named and len(positional) == len(self.names):
+            return positional
+        parameters = [inspect.Parameter(name, inspect.Parameter.POSITIONAL_OR_KEYWORD)
+                      for name in self.names]
+        try:
+            return inspect.Signature(parameters).bind(*positional, **named).args
+        except TypeError as error:
+            raise TypeError(f"{error}; the call is {self.signature()}") from None
+
+    def __call__(self, *positional, **named):
+        values = self.bind(positional, named)
+        if self.is_scalar and any(np.ndim(value) for value in values):
+            return self._mapped(values)
+        return self._called(values)
+
+    def _called(self, values, place="", warned=None):
+        lengths = tuple(map(self._length, self.given, values)) if self.has_plan else ()
+        values = iter(values)
+        c_arguments, kept = [], []
+        for argument in self.arguments:
+            value = next(values) if self._is_given(argument) else None
+            c_argument, keep = self._prepare(argument, value, lengths)
+            c_arguments.append(c_argument)
+            kept.append(keep)
+        result = self.function(*c_arguments)
+        return self._finish(result, kept, place, warned)
+
+    def _prepare(self, argument, value, lengths):
+        """What the function is given, and what is kept to read results from."""
+        kind, name, element = argument["kind"], argument["name"], argument.get("element")
+        if kind.startswith("array"):
+            dimensions = int(kind[5])
+            if argument["direction"] == "out":
+                block = arrays.empty(element, dimensions)
+            else:
+                block = arrays.filled(value, element, dimensions, name,
+                                      reuse=argument["direction"] == "in")
+            return ctypes.c_void_p(block.handle), block
+        if kind == "value":
+            number = scalar(value, element, name)
+            return number, number
+        if kind in ("reference", "inout"):
+            number = scalar(value, element, name)
+            return ctypes.byref(number), number
+        if kind in ("output", "error"):
+            number = ((COMPLEX_PARTS[element] * 2)() if element in COMPLEX_PARTS
+                      else C_TYPES[element]())
+            return ctypes.byref(number), number
+        if kind in ("slot", "instance"):
+            word = plans.word((self.name, name, lengths), argument)
+            return ctypes.c_void_p(word.address), word
+        if kind == "record":
+            record = record_type(element)()
+            for field, content in (value or {}).items():
+                if field not in dict(record._fields_):
+                    raise ValueError(f"{name}: {element} has no field {field!r}")
+                setattr(record, field, content)
+            return ctypes.byref(record), record
+        if kind == "opaque":
+            pointer = ctypes.c_void_p(value)
+            return (ctypes.byref(pointer) if argument["direction"] == "out" else pointer), pointer
+        raise TypeError(f"{self.name} takes a {kind}, which cannot be given from Python")
+
+    def _finish(self, result, kept, place, warned):
+        results = []
+        for argument, keep in zip(self.arguments, kept):
+            if argument["direction"] == "in" or argument["kind"] in ("slot", "instance", "error"):
+                continue
+            if argument["kind"].startswith("array"):
+                results.append(keep.view())
+            elif argument["kind"] == "record":
+                results.append({field: getattr(keep, field) for field, _ in keep._fields_})
+            elif argument["kind"] == "opaque":
+                results.append(keep.value)
+            else:
+                results.append(plain(keep, argument["element"]))
+        status = kept[-1].value if self.has_error else 0
+        if status == 0 and (self.has_error or self.entry["returns"] == "ErrorCode"):
+            status = result or 0
+        if status < 0 or status in HOST_FAILURES:
+            raise QxError(self.name, status, dict(zip([a["name"] for a in self.taken], results)),
+                          place)
+        if status > 0:
+            if warned is None:
+                warnings.warn(QxWarning(self.name, status), stacklevel=5)
+            else:
+                warned.add(status)
+        if not results:
+            return result if self.gives_value else None
+        return results[0] if len(results) == 1 else tuple(results)
+
+    def _mapped(self, values):
+        """A function of scalars over arrays, element by element, with NumPy's broadcasting."""
+        spread = np.broadcast_arrays(*[
+            arrays.checked(value, arrays.element_dtype(a["element"]), np.ndim(value), a["name"])
+            for value, a in zip(values, self.given)])
+        shape = spread[0].shape
+        rows = zip(*[array.ravel().tolist() for array in spread])
+        if self.is_function:
+            return np.array([self.function(*row) for row in rows], float).reshape(shape)
+        warned = set()
+        found = [self._called(row, f" at element {i}", warned) for i, row in enumerate(rows)]
+        for status in sorted(warned):
+            warnings.warn(QxWarning(self.name, status), stacklevel=4)
+        if found and isinstance(found[0], tuple):
+            return tuple(np.array(column).reshape(shape) for column in zip(*found))
+        return np.array(found, None if found else float).reshape(shape)
+
+
+@functools.lru_cache(maxsize=None)
+def export(name):
+    entry = library().entries.get(name)
+    if entry is None:
+        close = difflib.get_close_matches(name, library().entries, 3, 0.6)
+        hint = f"; did you mean {' or '.join(close)}?" if close else ""
+        raise LookupError(f"there is no export {name}{hint}")
+    return Export(entry)
+
+
+def call(name, *positional, **named):
+    """Calls an export.
+
+    Inputs are given in the order of the declaration: arrays as anything that NumPy takes, scalars
+    as numbers whether they travel by value or by reference, records as dictionaries, arrays of
+    records as lists of tuples. Outputs come back in the order of the declaration, arrays as NumPy
+    arrays, a single one bare and several as a tuple; an array that is input and output comes back
+    as a new one. Plans are kept behind the scenes. A failure raises QxError, a warning is given
+    as QxWarning. A function of scalars maps over arrays.
+    """
+    return export(name)(*positional, **named)

@@ -1,0 +1,79 @@
+"""The words in which exports keep their plans from call to call.
+
+A plan slot or an instance word belongs to one call at a time and is made for one length, so each
+thread keeps its own, one for each export and lengths of input. Only the latest are kept. They are
+released when they are dropped, when their thread ends, and at exit.
+"""
+
+import atexit
+import collections
+import ctypes
+import threading
+import weakref
+
+from .library import library
+
+KEPT_PER_THREAD = 64
+
+_caches = weakref.WeakSet()
+
+
+class Word:
+    """One word and how it is released."""
+
+    def __init__(self, argument):
+        self.value = ctypes.c_void_p(None)
+        self.address = ctypes.addressof(self.value)
+        self._instance = argument["kind"] == "instance"
+        self._measurement = "Measure" in argument["type"]
+
+    def release(self):
+        if not self.value.value:
+            return
+        if self._instance:
+            name = "MeasurementUnreserveProc" if self._measurement else "TransformUnreserveProc"
+            getattr(library().module, name)(ctypes.byref(self.value))
+        else:
+            library().host.QXHostReleaseObject(self.value)
+        self.value.value = None
+
+
+class Cache:
+    def __init__(self):
+        self.words = collections.OrderedDict()
+        _caches.add(self)
+
+    def word(self, key, argument):
+        word = self.words.get(key)
+        if word is None:
+            word = self.words[key] = Word(argument)
+            if len(self.words) > KEPT_PER_THREAD:
+                self.words.popitem(last=False)[1].release()
+        else:
+            self.words.move_to_end(key)
+        return word
+
+    def clear(self):
+        while self.words:
+            self.words.popitem()[1].release()
+
+    __del__ = clear
+
+
+class _PerThread(threading.local):
+    def __init__(self):
+        self.cache = Cache()
+
+
+_per_thread = _PerThread()
+
+
+def word(key, argument):
+    return _per_thread.cache.word(key, argument)
+
+
+@atexit.register
+def release():
+    """Releases every plan that is kept. No call may be running in another thread."""
+    for cache in list(_caches):
+        cache.clear()

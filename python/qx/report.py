@@ -1,0 +1,245 @@
+"""The report on a recording: figures in a table, plots in a page. Every number comes from an
+export; NumPy only carries arrays.
+
+A section is a function that takes a recording and gives a Section; SECTIONS lists them in the
+order of the page.
+"""
+
+import dataclasses
+import html
+import io
+import math
+import os
+from datetime import datetime, timezone
+
+import numpy as np
+
+from .calls import call
+
+BLUE, DARK, GREY, WARM = "#2f6db3", "#1f2d3d", "#8795a6", "#c8553d"
+
+
+@dataclasses.dataclass
+class Row:
+    label: str
+    value: str
+    unit: str
+    export: str  # the export behind the number, and what else went into it
+
+
+@dataclasses.dataclass
+class Section:
+    title: str
+    text: str  # one paragraph
+    rows: list = dataclasses.field(default_factory=list)
+    figures: list = dataclasses.field(default_factory=list)  # SVG texts
+    terminal: list = dataclasses.field(default_factory=list)  # further lines for the terminal
+
+
+def number(value, digits=6):
+    return f"{value:.{digits}g}"
+
+
+def power_unit(unit, exponent):
+    if not unit or exponent == 1:
+        return unit
+    return unit + {2: "²", 3: "³", 4: "⁴"}[exponent]
+
+
+def quantity(recording):
+    """The label of an axis of values."""
+    name = recording.channel[:1].upper() + recording.channel[1:]
+    return f"{name} ({recording.unit})" if recording.unit else name
+
+
+def bins_for(n):
+    """Twice the cube root of the number of samples, within what a plot can show."""
+    return int(min(120, max(5, round(2 * n ** (1 / 3)))))
+
+
+# Plots
+
+def _pyplot():
+    import matplotlib
+    matplotlib.use("svg")
+    import matplotlib.pyplot as plt
+    plt.rcParams.update({
+        "font.family": "DejaVu Sans", "font.size": 9.5, "axes.edgecolor": GREY,
+        "axes.labelcolor": DARK, "axes.titlesize": 11, "axes.titlecolor": DARK,
+        "axes.titleweight": "bold", "axes.titlelocation": "left", "axes.spines.top": False,
+        "axes.spines.right": False, "axes.grid": True, "grid.color": "#dfe5ec",
+        "grid.linewidth": 0.7, "axes.axisbelow": True, "xtick.color": DARK, "ytick.color": DARK,
+        "svg.fonttype": "path", "svg.hashsalt": "qx", "figure.constrained_layout.use": True})
+    return plt
+
+
+def _svg(plt, figure):
+    buffer = io.StringIO()
+    figure.savefig(buffer, format="svg", metadata={"Date": None})
+    plt.close(figure)
+    text = buffer.getvalue()
+    return text[text.index("<svg"):]
+
+
+def _trace(axes, x, y, **style):
+    """A line, or the band between extremes where there are more samples than a plot can show."""
+    limit = 12000
+    if len(x) <= limit:
+        axes.plot(x, y, **style)
+        return
+    group = -(-len(x) // (limit // 4))
+    whole = len(x) // group * group
+    parts = y[:whole].reshape(-1, group)
+    axes.fill_between(x[:whole:group], parts.min(axis=1), parts.max(axis=1),
+                      color=style.get("color"), linewidth=0.4)
+
+
+# Sections
+
+def overview(recording):
+    n, unit = len(recording.values), recording.unit
+    figures = []
+    plt = _pyplot()
+    times = recording.times()
+    figure, axes = plt.subplots(figsize=(10, 2.9))
+    _trace(axes, times, recording.values, color=BLUE, linewidth=0.7)
+    axes.set(title="The whole recording", xlabel=f"Time ({recording.time_unit})",
+             ylabel=quantity(recording))
+    axes.margins(x=0.005)
+    figures.append(_svg(plt, figure))
+    part = _excerpt(recording)
+    if part < n:
+        figure, axes = plt.subplots(figsize=(10, 2.9))
+        _trace(axes, times[:part], recording.values[:part], color=BLUE, linewidth=1.1)
+        shown = f"{times[part - 1]:.3g} {recording.time_unit}"
+        axes.set(title=f"The first {shown}", xlabel=f"Time ({recording.time_unit})",
+                 ylabel=quantity(recording))
+        axes.margins(x=0.005)
+        figures.append(_svg(plt, figure))
+    if recording.rate:
+        text = (f"{n} samples, {n / recording.rate:.6g} s at {recording.rate:.10g} samples per "
+                f"second ({recording.rate_source}).")
+    else:
+        text = f"{n} samples; the sampling rate is not known (--rate sets it)."
+    if unit:
+        text += f" Values in {unit}."
+    return Section("Recording", text, figures=figures)
+
+
+def _excerpt(recording):
+    """The number of samples at the start that show the shape of the signal."""
+    n = len(recording.values)
+    count = round(5 * recording.rate) if recording.rate and recording.rate < 2000 else 2000
+    return count if count < 0.6 * n else n
+
+
+def statistics(recording):
+    x, unit = recording.values, recording.unit
+    mean = call("Mean_head", x)
+    moments = {order: call("Moment_head", x, order) for order in (2, 3, 4)}
+    bins = bins_for(len(x))
+    modes = call("ModeH", x, bins)
+    rows = [Row("Mean", number(mean), unit, "Mean_head"),
+            Row("Root mean square", number(call("RMS_head", x)), unit, "RMS_head"),
+            Row("Median", number(call("Median_head", x)), unit, "Median_head"),
+            Row(f"Mode, fullest of {bins} bins", ", ".join(map(number, modes[:4])) or "none", unit,
+                "ModeH")]
+    rows += [Row(f"Central moment of order {order}", number(moment), power_unit(unit, order),
+                 "Moment_head") for order, moment in moments.items()]
+    deviation = math.sqrt(moments[2])
+    rows.append(Row("Standard deviation", number(deviation), unit, "√ moment 2"))
+    if deviation > 0:
+        rows.append(Row("Skewness", number(moments[3] / deviation**3), "",
+                        "moment 3 / deviation³"))
+        rows.append(Row("Kurtosis", number(moments[4] / deviation**4), "",
+                        "moment 4 / deviation⁴"))
+    return Section("Statistics", "All moments are about the mean and divided by the number of "
+                   "samples.", rows)
+
+
+def histogram(recording):
+    x = recording.values
+    counts, centres = call("histgran_head", x, bins_for(len(x)))
+    mean, median = call("Mean_head", x), call("Median_head", x)
+    width = centres[1] - centres[0] or 1.0
+    plt = _pyplot()
+    figure, axes = plt.subplots(figsize=(10, 3.1))
+    axes.bar(centres, counts, width=0.92 * width, color=BLUE)
+    for value, name, colour in ((mean, "mean", WARM), (median, "median", DARK)):
+        axes.axvline(value, color=colour, linewidth=1.3, label=f"{name} {number(value, 4)}",
+                     linestyle="-" if name == "mean" else "--")
+    axes.legend(frameon=False)
+    axes.set(title=f"Histogram, {len(counts)} bins of width {number(width, 3)} {recording.unit}",
+             xlabel=quantity(recording), ylabel="Samples per bin")
+    axes.grid(axis="x", visible=False)
+    coarse, coarse_centres = call("histgran_head", x, 12)
+    longest = max(1, coarse.max())
+    bars = [f"{number(centre, 4):>11} {recording.unit}  {'#' * round(40 * count / longest):<40} {count}"
+            for centre, count in zip(coarse_centres, coarse)]
+    return Section("Histogram", "Equal bins over the range of the data (histgran_head).",
+                   figures=[_svg(plt, figure)], terminal=["Histogram (bin centre, samples)", *bars])
+
+
+SECTIONS = [overview, statistics, histogram]
+
+
+# Output
+
+STYLE = """
+body { font: 15px/1.5 "DejaVu Sans", "Segoe UI", Helvetica, Arial, sans-serif; color: #1f2d3d;
+       max-width: 62em; margin: 2em auto; padding: 0 1.2em; background: #fff; }
+h1 { font-size: 1.6em; margin-bottom: .1em; } h2 { font-size: 1.15em; margin: 1.8em 0 .4em;
+     border-bottom: 1px solid #dfe5ec; padding-bottom: .2em; }
+p.source { color: #5b6b7d; margin-top: 0; } figure { margin: 0 0 .6em; }
+figure svg { width: 100%; height: auto; }
+table { border-collapse: collapse; } td, th { padding: .22em 1.4em .22em 0; text-align: left;
+     border-bottom: 1px solid #eef1f5; } td.value { text-align: right; white-space: nowrap;
+     font-variant-numeric: tabular-nums; padding-right: .5em; } td.export { color: #5b6b7d;
+     font-family: "DejaVu Sans Mono", Consolas, monospace; font-size: .86em; }
+footer { margin-top: 3em; color: #8795a6; font-size: .85em; }
+"""
+
+
+def page(recording, sections):
+    escape = html.escape
+    title = recording.name
+    out = ["<!DOCTYPE html>", '<html lang="en"><head><meta charset="utf-8">',
+           f"<title>{escape(title)}</title><style>{STYLE}</style></head><body>",
+           f"<h1>{escape(title)}</h1>"]
+    if recording.notes:
+        out.append(f'<p class="source">{escape(" ".join(recording.notes))}</p>')
+    for section in sections:
+        out.append(f"<h2>{escape(section.title)}</h2><p>{escape(section.text)}</p>")
+        if section.rows:
+            out.append("<table><tr><th>Quantity</th><th>Value</th><th></th><th>From</th></tr>")
+            out += [f'<tr><td>{escape(row.label)}</td><td class="value">{escape(row.value)}</td>'
+                    f'<td>{escape(row.unit)}</td><td class="export">{escape(row.export)}</td></tr>'
+                    for row in section.rows]
+            out.append("</table>")
+        out += [f"<figure>{figure}</figure>" for figure in section.figures]
+    made = datetime.now(timezone.utc).strftime("%Y-%m-%d %H:%M UTC")
+    out.append(f"<footer>Made {made} by python3 -m qx report.</footer></body></html>")
+    return "\n".join(out) + "\n"
+
+
+def lines(recording, sections):
+    """The report for the terminal."""
+    yield recording.name
+    for section in sections:
+        yield ""
+        yield f"{section.title}: {section.text}"
+        width = max((len(row.label) for row in section.rows), default=0)
+        for row in section.rows:
+            yield (f"  {row.label:<{width}}  {row.value:>14} {row.unit:<6} {row.export}").rstrip()
+        yield from (f"  {line}" for line in section.terminal)
+
+
+def write(recording, path):
+    """Writes the page and gives the lines for the terminal."""
+    sections = [section(recording) for section in SECTIONS]
+    folder = os.path.dirname(path)
+    if folder:
+        os.makedirs(folder, exist_ok=True)
+    with open(path, "w", encoding="utf-8") as file:
+        file.write(page(recording, sections))
+    return list(lines(recording, sections))

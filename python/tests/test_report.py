@@ -1,0 +1,160 @@
+"""Recordings, the report and the command line."""
+
+import contextlib
+import io
+import os
+import re
+import struct
+import sys
+import tempfile
+import unittest
+import xml.etree.ElementTree
+from pathlib import Path
+
+import numpy as np
+
+PYTHON = Path(__file__).resolve().parent.parent
+sys.path.insert(0, str(PYTHON))
+from qx import __main__ as command  # noqa: E402
+from qx import recording  # noqa: E402
+
+ECG = PYTHON.parent / "examples/data/ecg_208_360hz.csv"
+
+
+def run(*arguments):
+    """The exit code, the output and the error output of a command."""
+    out = io.TextIOWrapper(io.BytesIO(), "utf-8", write_through=True)
+    err = io.TextIOWrapper(io.BytesIO(), "utf-8", write_through=True)
+    with contextlib.redirect_stdout(out), contextlib.redirect_stderr(err):
+        code = command.main(list(map(str, arguments)))
+    return code, out.buffer.getvalue().decode(), err.buffer.getvalue().decode()
+
+
+class InFolder(unittest.TestCase):
+    def setUp(self):
+        folder = tempfile.TemporaryDirectory()
+        self.addCleanup(folder.cleanup)
+        self.folder = Path(folder.name)
+
+    def file(self, content, name="data.csv"):
+        path = self.folder / name
+        path.write_bytes(content if isinstance(content, bytes) else content.encode())
+        return path
+
+
+def wav(samples, form=1, bits=16, rate=8000, channels=1):
+    body = b"".join(samples)
+    block = channels * bits // 8
+    fmt = struct.pack("<HHIIHH", form, channels, rate, rate * block, block, bits)
+    chunks = b"fmt " + struct.pack("<I", 16) + fmt + b"LIST" + struct.pack("<I", 3) + b"odd\0" \
+        + b"data" + struct.pack("<I", len(body)) + body
+    return b"RIFF" + struct.pack("<I", 4 + len(chunks)) + b"WAVE" + chunks
+
+
+class Reading(InFolder):
+    def test_tables(self):
+        for text, values, rate, unit in (
+                ("1\n2.5\n-3e-1\n", [1, 2.5, -0.3], None, ""),
+                ("# at 50 Hz\nforce [N]\n1\n2\n", [1, 2], 50, "N"),
+                ("t;u (mV)\n0;1,5\n0,5;2,5\n1;3,5\n", [1.5, 2.5, 3.5], 2, "mV"),
+                ("time [ms],x\n0,4\n2,5\n4,6\n", [4, 5, 6], 500, ""),
+                ("\ufeffvalue\r\n1\r\n\r\n2\r\n", [1, 2], None, ""),
+                ("1 10\n2 20\n", [1, 2], None, "")):
+            with self.subTest(text=text):
+                read = recording.read(self.file(text))
+                np.testing.assert_allclose(read.values, values)
+                self.assertEqual((read.rate, read.unit), (rate, unit))
+        two = self.file("a,b\n1,2\n3,4\n")
+        self.assertEqual(recording.read(two, column="b").values.tolist(), [2, 4])
+        self.assertEqual(recording.read(two, column="2").values.tolist(), [2, 4])
+        self.assertEqual(recording.read(self.file("1\n", "tone_44.1khz.csv")).rate, 44100)
+        self.assertEqual(recording.read(self.file("1\n", "tone_8hz.csv"), rate=5.0).rate, 5)
+
+    def test_wav_files(self):
+        for samples, form, bits in (
+                ([struct.pack("<h", v) for v in (0, 16384, -32768)], 1, 16),
+                ([bytes([v]) for v in (128, 192, 0)], 1, 8),
+                ([struct.pack("<i", v)[:3] for v in (0, 1 << 22, -(1 << 23))], 1, 24),
+                ([struct.pack("<i", v) for v in (0, 1 << 30, -(1 << 31))], 1, 32),
+                ([struct.pack("<f", v) for v in (0, 0.5, -1)], 3, 32),
+                ([struct.pack("<d", v) for v in (0, 0.5, -1)], 3, 64)):
+            with self.subTest(form=form, bits=bits):
+                read = recording.read(self.file(wav(samples, form, bits), "a.wav"))
+                self.assertEqual((read.values.tolist(), read.rate), ([0, 0.5, -1], 8000))
+        stereo = wav([struct.pack("<hh", 0, 16384)] * 2, channels=2)
+        self.assertEqual(recording.read(self.file(stereo), column="2").values.tolist(), [0.5, 0.5])
+
+    def test_bad_input_is_one_line_that_says_what_and_where(self):
+        nan_wav = wav([struct.pack("<f", v) for v in (0, float("nan"))], 3, 32)
+        for content, reason in (
+                ("", "is empty"), ("# only\n\n", "holds no numbers"), ("a\nb\n", "holds no numbers"),
+                ("1\n2\nnan\n", ":3: 'nan' is not a finite"), ("v\n1\n-inf\n", ":3: '-inf' is not"),
+                ("1\n# c\nx2\n", ":3: 'x2' is not a number"), ("t,u\n0,1\n1,\n", ":3: column 2"),
+                (b"\x7fELF\x01\0\0", ":1: neither"),
+                (b"1\n2\n\x00\n", ":3: neither"), (b"RIFF\0\0\0\0WAVE", "no format"),
+                (wav([]), "no samples"), (wav([b"\0\0"], form=85), "cannot be read"),
+                (nan_wav, "sample 2")):
+            with self.subTest(content=content[:30]):
+                path = self.file(content)
+                code, _, err = run("report", path, "--out", self.folder / "r.html")
+                self.assertEqual(code, 2)
+                self.assertEqual(err.count("\n"), 1, err)
+                self.assertIn(str(path), err)
+                self.assertIn(reason, err)
+                self.assertFalse((self.folder / "r.html").exists())
+        for arguments, reason in (([self.folder], "is a folder"),
+                                  ([self.folder / "none.csv"], "no such file"),
+                                  ([self.file("1,2\n"), "--column", "c"], "no column 'c'")):
+            code, _, err = run("report", *arguments)
+            self.assertEqual((code, err.count("\n")), (2, 1))
+            self.assertIn(reason, err)
+
+
+class Report(InFolder):
+    def test_of_the_example(self):
+        page = self.folder / "new" / "report.html"
+        code, out, err = run("report", ECG, "--out", page)
+        self.assertEqual((code, err), (0, ""))
+        x = np.loadtxt(ECG, skiprows=2)
+        d = x - x.mean()
+        expected = {"Mean": x.mean(), "Root mean square": np.sqrt(np.mean(x * x)),
+                    "Median": np.median(x), "Central moment of order 2": np.mean(d**2),
+                    "Central moment of order 3": np.mean(d**3),
+                    "Central moment of order 4": np.mean(d**4)}
+        for label, value in expected.items():
+            shown = re.search(rf"^  {label} +(\S+)", out, re.MULTILINE)
+            self.assertIsNotNone(shown, label)
+            self.assertAlmostEqual(float(shown.group(1)), value, delta=1e-5 * abs(value))
+        self.assertIn("30 s at 360 samples per second", out)
+        text = page.read_text("utf-8")
+        self.assertIn("MIT-BIH", text)
+        figures = re.findall(r"<svg.*?</svg>", text, re.DOTALL)
+        self.assertGreaterEqual(len(figures), 3)
+        for figure in figures:
+            xml.etree.ElementTree.fromstring(figure)
+
+    def test_of_data_without_spread_and_of_one_sample(self):
+        for text in ("7\n", "7\n7\n7\n", "1e300\n-1e300\n", "0\n"):
+            with self.subTest(text=text):
+                code, out, err = run("report", self.file(text), "--out", self.folder / "r.html")
+                self.assertEqual((code, err), (0, ""))
+                self.assertIn("the sampling rate is not known", out)
+
+
+class Catalogue(unittest.TestCase):
+    def test_list_and_show(self):
+        code, out, _ = run("list", "m*_head")
+        self.assertEqual(code, 0)
+        self.assertEqual(re.findall(r"^  (M\w+_head)", out, re.MULTILINE),
+                         ["Mean_head", "MSE_head", "Moment_head", "Median_head"])
+        code, out, _ = run("show", "Moment_head")
+        self.assertEqual(code, 0)
+        for part in ('moment = qx.call("Moment_head", x, order)', "-20021  ErrOrderNotPositive", "qx/stats.h"):
+            self.assertIn(part, out)
+        for arguments in (["show", "Moment"], ["list", "no-such"]):
+            code, _, err = run(*arguments)
+            self.assertEqual((code, err.count("\n")), (2, 1))
+
+
+if __name__ == "__main__":
+    unittest.main()
