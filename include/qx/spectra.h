@@ -26,7 +26,7 @@ QX_API ErrorCode CxSpectrumH_IDP(QX_IN CDB1D x, QX_OUT DBL1D spectrum,
                                  QX_INOUT InstanceWord *instance);
 
 /** The cross spectrum: cross[k] = conj(X[k]) Y[k] / n^2, n values. Element 0 and, for even n,
-    element n/2 have the imaginary part 0; element n-k is the conjugate of element k to the bit.
+    element n/2 have the imaginary part zero; element n-k is the conjugate of element k to the bit.
     Codes: ErrEmptyInput (x or y is empty), ErrSizeMismatch (their sizes differ), the host's own
     status where it refuses the output (a positive one leaves the output as it is), ErrOutOfMemory
     (no memory). */

@@ -52,9 +52,10 @@ def show_export(options):
 def report_on(options):
     from . import recording, report
     read = recording.read(options.file, options.rate, options.column)
-    for line in report.write(read, options.out):
+    path = os.path.join(options.output, "report.html")
+    for line in report.write(read, path):
         print(line)
-    print(f"\nThe report with plots: {options.out}")
+    print(f"\nThe report with plots: {path}")
 
 
 def positive(text):
@@ -77,7 +78,8 @@ def arguments(argv):
     command.add_argument("file")
     command.add_argument("--rate", type=positive, metavar="HZ", help="samples per second")
     command.add_argument("--column", metavar="NAME", help="column or channel, a name or a number")
-    command.add_argument("--out", default=os.path.join("out", "report.html"), metavar="FILE")
+    command.add_argument("--output", default="out", metavar="FOLDER",
+                         help="where report.html goes, out by default")
     command.set_defaults(run=report_on)
     return parser.parse_args(argv)
 

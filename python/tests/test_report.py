@@ -16,7 +16,7 @@ import numpy as np
 PYTHON = Path(__file__).resolve().parent.parent
 sys.path.insert(0, str(PYTHON))
 from qx import __main__ as command  # noqa: E402
-from qx import recording  # noqa: E402
+from qx import recording, report  # noqa: E402
 
 ECG = PYTHON.parent / "examples/data/ecg_208_360hz.csv"
 
@@ -96,12 +96,12 @@ class Reading(InFolder):
                 (nan_wav, "sample 2")):
             with self.subTest(content=content[:30]):
                 path = self.file(content)
-                code, _, err = run("report", path, "--out", self.folder / "r.html")
+                code, _, err = run("report", path, "--output", self.folder / "out")
                 self.assertEqual(code, 2)
                 self.assertEqual(err.count("\n"), 1, err)
                 self.assertIn(str(path), err)
                 self.assertIn(reason, err)
-                self.assertFalse((self.folder / "r.html").exists())
+                self.assertFalse((self.folder / "out").exists())
         for arguments, reason in (([self.folder], "is a folder"),
                                   ([self.folder / "none.csv"], "no such file"),
                                   ([self.file("1,2\n"), "--column", "c"], "no column 'c'")):
@@ -113,7 +113,7 @@ class Reading(InFolder):
 class Report(InFolder):
     def test_of_the_example(self):
         page = self.folder / "new" / "report.html"
-        code, out, err = run("report", ECG, "--out", page)
+        code, out, err = run("report", ECG, "--output", page.parent)
         self.assertEqual((code, err), (0, ""))
         x = np.loadtxt(ECG, skiprows=2)
         d = x - x.mean()
@@ -136,9 +136,33 @@ class Report(InFolder):
     def test_of_data_without_spread_and_of_one_sample(self):
         for text in ("7\n", "7\n7\n7\n", "1e300\n-1e300\n", "0\n"):
             with self.subTest(text=text):
-                code, out, err = run("report", self.file(text), "--out", self.folder / "r.html")
+                code, out, err = run("report", self.file(text), "--output", self.folder / "out")
                 self.assertEqual((code, err), (0, ""))
                 self.assertIn("the sampling rate is not known", out)
+
+
+class Spectra(unittest.TestCase):
+    def test_a_sinusoid_has_its_amplitude(self):
+        for n in (100, 101):
+            x = 3 + 0.5 * np.cos(2 * np.pi * 7 * np.arange(n) / n + 0.3)
+            frequencies, amplitudes = report.amplitude_spectrum(
+                recording.Recording("", x, None, "", "", "", []))
+            expected = np.zeros(n // 2 + 1)
+            expected[[0, 7]] = 3, 0.5
+            np.testing.assert_allclose(amplitudes, expected, atol=1e-13)
+            self.assertAlmostEqual(frequencies[7], 7 / n)
+
+    def test_the_averaged_spectrum_is_a_density(self):
+        x = np.random.default_rng(4).normal(size=1000)
+        for length in (64, 50):
+            frequencies, density, segments = report.averaged_spectrum(x, length)
+            window = 0.5 - 0.5 * np.cos(2 * np.pi * np.arange(length) / length)
+            starts = range(0, 1000 - length + 1, length // 2)
+            parts = [np.abs(np.fft.rfft(window * x[i:i + length]))**2 for i in starts]
+            expected = np.mean(parts, axis=0) / np.sum(window**2)
+            expected[1:-1] *= 2
+            np.testing.assert_allclose(density, expected, rtol=1e-9)
+            self.assertEqual(segments, len(parts))
 
 
 class Catalogue(unittest.TestCase):
