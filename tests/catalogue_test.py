@@ -13,7 +13,9 @@ import catalogue  # noqa: E402
 
 SHAPES = """#ifndef GUARD
 #define GUARD
-#include "qx/types.h" /* QX_API in a comment is none */
+/* Shapes of all kinds: QX_API in a comment is none.
+     Indented. */
+#include "qx/types.h"
 QX_BEGIN_DECLS
 /** A pair. */
 typedef struct Interval {
@@ -84,6 +86,9 @@ class Reading(unittest.TestCase):
         self.assertEqual([f["name"] for f in result["records"]["Interval"]["fields"]],
                          ["lower", "upper", "closure", "edges", "spare"])
         self.assertTrue(result["records"]["WorkspaceStatus"]["packed"])
+        self.assertEqual(result["families"], [{
+            "name": "shapes", "header": "qx/shapes.h",
+            "introduction": "Shapes of all kinds: QX_API in a comment is none.\nIndented."}])
         self.assertEqual(result["codes"]["ErrOutOfMemory"], -20001)
 
     def test_files_written(self):

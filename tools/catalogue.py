@@ -178,7 +178,7 @@ class Types:
 
 
 def documentation_of(comment):
-    lines = comment.text[3:-2].split("\n")
+    lines = re.sub(r"^/\*+", "", comment.text)[:-2].split("\n")
     lines = [lines[0].strip()] + [re.sub(r"^\s*\* ?", "", line).rstrip() for line in lines[1:]]
     margins = [len(line) - len(line.lstrip()) for line in lines[1:] if line.strip()]
     margin = min(margins, default=0)
@@ -313,6 +313,7 @@ def read_headers(include):
     folder = Path(include) / "qx"
     codes = codes_of(folder / "errors.h")
     types, exports, seen = Types(), [], {}
+    introductions = []
     umbrella = (folder / "qx.h").read_text("utf-8") if (folder / "qx.h").exists() else None
     families = sorted(p for p in folder.glob("*.h") if p.name not in NOT_A_FAMILY)
     parsed = [(path, list(statements_of(path, path.read_text("utf-8"))))
@@ -324,6 +325,9 @@ def read_headers(include):
     for path, statements in parsed[1:]:
         if umbrella is not None and f'"qx/{path.name}"' not in umbrella:
             raise HeaderError(path, 1, "qx.h does not include this header")
+        first = next((t for t in tokens_of(path.read_text("utf-8")) if t.text.startswith("/*")), None)
+        introductions.append({"name": path.stem, "header": f"qx/{path.name}",
+                              "introduction": documentation_of(first) if first else ""})
         for statement in statements:
             if statement.words[0] == "QX_API":
                 export = export_of(path, statement, types, codes)
@@ -336,7 +340,8 @@ def read_headers(include):
                 raise HeaderError(path, statement.line, "QX_API must begin the declaration")
             elif "(" in statement.words and statement.words[0] not in ("typedef", "enum"):
                 raise HeaderError(path, statement.line, "a function that is not marked QX_API")
-    return {"codes": codes, "records": types.records, "exports": exports}
+    return {"codes": codes, "records": types.records, "families": introductions,
+            "exports": exports}
 
 
 def version_script(catalogue):

@@ -1,0 +1,26 @@
+import numpy as np
+import qx
+
+#%% A bare window: multiply ones
+window = qx.call("AllWinH", np.ones(8), 1, np.nan, 0, 0)
+print("Hanning, periodic: ", window)
+print("Hanning, symmetric:", qx.call("AllWinH", np.ones(8), 1, np.nan, 0, 1))
+
+#%% Noise bandwidth and coherent gain
+for name, selector in (("rectangle", 0), ("Hanning", 1), ("flat top", 6), ("Dolph-Chebyshev", 61)):
+    constants = qx.call("WinConstByNameH_2016", 1024, selector, np.nan)
+    print(f"{name:16} {constants['enbw']:.4f} bins, gain {constants['cg']:.4f}")
+
+#%% What windows do to leakage
+import matplotlib.pyplot as plt  # hidden
+n = 256
+x = np.cos(2 * np.pi * 40.5 * np.arange(n) / n)
+figure, axes = plt.subplots(figsize=(8, 3.2))  # hidden
+for name, selector in (("rectangle", 0), ("Hanning", 1), ("Blackman-Harris, 4 terms", 7)):
+    scaled = qx.call("AllWinH", x, selector, np.nan, 1, 0)
+    power = qx.call("SpectrumH", scaled)[:n // 2]
+    level = 10 * np.log10(np.maximum(power, 1e-20))
+    print(f"{name:26} {level[100]:7.1f} dB at bin 100")
+    axes.plot(level, label=name)  # hidden
+axes.legend(frameon=False)  # hidden
+axes.set(xlabel="Bin", ylabel="Power (dB)", ylim=(-160, 0))  # hidden

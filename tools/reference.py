@@ -1,0 +1,173 @@
+#!/usr/bin/python3
+"""Writes the reference: one page per family of exports, with examples that are run for it.
+
+    reference.py --library BUILD_DIR --output FOLDER
+
+Declarations and documentation come from the catalogue. The examples are the Python files in
+examples/reference, one per family, cut at lines "#%% title"; each part is shown with what it
+prints and plots. An example that fails ends the run.
+"""
+
+import argparse
+import contextlib
+import html
+import io
+import os
+import re
+import sys
+import traceback
+from pathlib import Path
+
+ROOT = Path(__file__).resolve().parent.parent
+sys.path.insert(0, str(ROOT / "python"))
+
+STYLE = """
+body { font: 15px/1.5 "DejaVu Sans", "Segoe UI", Helvetica, Arial, sans-serif; color: #1f2d3d;
+       max-width: 62em; margin: 2em auto; padding: 0 1.2em; }
+h1 { font-size: 1.6em; } h2 { font-size: 1.2em; border-bottom: 1px solid #dfe5ec; margin-top: 2em; }
+h3 { font-size: 1.02em; margin: 2em 0 .3em; } a { color: #2f6db3; text-decoration: none; }
+code, pre { font-family: "DejaVu Sans Mono", Consolas, monospace; font-size: .86em; }
+pre { background: #f5f7fa; padding: .6em .9em; overflow-x: auto; margin: .4em 0; }
+pre.out { background: #fff; border-left: 3px solid #c9d3df; color: #44546a; }
+table { border-collapse: collapse; } td, th { padding: .15em 1.2em .15em 0; text-align: left;
+       vertical-align: top; border-bottom: 1px solid #eef1f5; }
+figure { margin: .6em 0; } figure svg { width: 100%; height: auto; }
+ul.index { columns: 3; padding-left: 1.2em; font-size: .92em; }
+"""
+KINDS = {"array1d": "array of {}", "array2d": "matrix of {}", "value": "{}",
+         "reference": "{} by reference", "output": "{}", "inout": "{}", "error": "code",
+         "record": "record {}", "slot": "plan slot", "instance": "instance data",
+         "opaque": "pointer", "procedure": "procedure"}
+
+
+def marked(text):
+    return re.sub(r"`([^`]+)`", r"<code>\1</code>", html.escape(text, quote=False))
+
+
+def prose(text):
+    """Paragraphs; blocks of indented lines keep their layout, and codes begin a paragraph."""
+    parts, lines = [], []
+
+    def close():
+        if lines:
+            if all(line.startswith("    ") for line in lines):
+                parts.append(f"<pre>{html.escape(chr(10).join(line[4:] for line in lines))}</pre>")
+            else:
+                parts.append(f"<p>{marked(' '.join(map(str.strip, lines)))}</p>")
+            lines.clear()
+
+    for line in text.split("\n"):
+        indented = line.startswith("    ")
+        if lines and (re.match(r"-2\d{4}\b|Codes:", line) or not line
+                      or indented != lines[-1].startswith("    ")):
+            close()
+        if line:
+            lines.append(line)
+    close()
+    return "".join(parts)
+
+
+def page(title, body, up=True):
+    back = '<p><a href="index.html">All families</a></p>' if up else ""
+    return ('<!DOCTYPE html>\n<html lang="en"><head><meta charset="utf-8">'
+            f"<title>{html.escape(title)}</title><style>{STYLE}</style></head><body>{back}"
+            f"<h1>{html.escape(title)}</h1>{body}</body></html>\n")
+
+
+def export_text(entry, catalogue, library, signature):
+    rows = "".join(
+        f"<tr><td><code>{a['name']}</code></td><td>{a['direction']}</td>"
+        f"<td>{html.escape(KINDS[a['kind']].format(a.get('element', '')))}</td></tr>"
+        for a in entry["arguments"])
+    codes = "".join(
+        f"<tr><td>{catalogue['codes'][name]}</td><td><code>{name}</code></td>"
+        f"<td>{html.escape(library.error_text(catalogue['codes'][name]))}</td></tr>"
+        for name in entry["codes"])
+    declaration = html.escape(re.sub(r"QX_(IN|OUT|INOUT) ", "", entry["declaration"]))
+    return (f'<h3 id="{entry["name"]}">{entry["name"]}</h3><pre>{declaration};</pre>'
+            f"<pre>{html.escape(signature)}</pre>{prose(entry['documentation'])}"
+            + (f"<table>{rows}</table>" if rows else "")
+            + (f"<table>{codes}</table>" if codes else ""))
+
+
+class ExampleError(Exception):
+    """An example that does not run."""
+
+
+def examples(path):
+    """The parts of an example file: title, source, output, figures as SVG."""
+    from qx import report
+    plt = report._pyplot()
+    pieces = re.split(r"^#%% *(.*)\n", path.read_text("utf-8"), flags=re.MULTILINE)
+    names = {"__name__": "example"}
+    exec(compile(pieces[0], str(path), "exec"), names)
+    line = pieces[0].count("\n") + 1
+    for title, source in zip(pieces[1::2], pieces[2::2]):
+        output = io.StringIO()
+        try:
+            with contextlib.redirect_stdout(output):
+                exec(compile("\n" * line + source, str(path), "exec"), names)
+        except Exception as error:
+            raise ExampleError(f"{path}: '{title}': {traceback.format_exc()}") from error
+        figures = [report._svg(plt, plt.figure(number)) for number in plt.get_fignums()]
+        yield title, source.strip(), output.getvalue().rstrip(), figures
+        line += source.count("\n") + 1
+
+
+def examples_text(path):
+    out = ["<h2>Examples</h2><pre>import numpy as np\nimport qx</pre>"]
+    for title, source, output, figures in examples(path):
+        out.append(f"<h3>{html.escape(title)}</h3>")
+        shown = re.sub(r"^.*# hidden\n?", "", source, flags=re.MULTILINE)
+        out.append(f"<pre>{html.escape(shown)}</pre>")
+        if output:
+            out.append(f'<pre class="out">{html.escape(output)}</pre>')
+        out += [f"<figure>{figure}</figure>" for figure in figures]
+    return "".join(out)
+
+
+def write(output):
+    from qx.calls import export
+    from qx.library import library
+    lib = library()
+    catalogue = lib.catalogue
+    output.mkdir(parents=True, exist_ok=True)
+    index = ["<p>Every export of the module, by family. <code>python3 -m qx show NAME</code> tells "
+             "the same on the terminal.</p>"]
+    for family in catalogue["families"]:
+        entries = [e for e in catalogue["exports"] if e["family"] == family["name"]]
+        if not entries:
+            continue
+        name = family["name"]
+        links = "".join(f'<li><a href="{name}.html#{e["name"]}">{e["name"]}</a></li>' for e in entries)
+        body = [f"<p>Header <code>{family['header']}</code></p>", prose(family["introduction"]),
+                f'<ul class="index">{links}</ul>']
+        example = ROOT / "examples" / "reference" / f"{name}.py"
+        if example.exists():
+            body.append(examples_text(example))
+        body.append("<h2>Exports</h2>")
+        body += [export_text(e, catalogue, lib, export(e["name"]).signature()) for e in entries]
+        (output / f"{name}.html").write_text(page(name, "".join(body)), "utf-8")
+        first = re.split(r"(?<=\.)\s", " ".join(family["introduction"].split()))[0]
+        index.append(f'<h2><a href="{name}.html">{name}</a></h2><p>{marked(first)}</p>'
+                     f'<ul class="index">{links}</ul>')
+    (output / "index.html").write_text(page("Reference", "".join(index), up=False), "utf-8")
+
+
+def main(arguments=None):
+    parser = argparse.ArgumentParser(description=__doc__.split("\n")[0])
+    parser.add_argument("--library", required=True, help="folder of the built libraries")
+    parser.add_argument("--output", required=True, type=Path)
+    options = parser.parse_args(arguments)
+    os.environ["QX_LIBRARY_DIR"] = options.library
+    try:
+        write(options.output)
+    except ExampleError as error:
+        print(error, file=sys.stderr)
+        return 1
+    print(f"The reference: {options.output / 'index.html'}")
+    return 0
+
+
+if __name__ == "__main__":
+    sys.exit(main())
