@@ -20,7 +20,7 @@ for name, selector in (("rectangle", 0), ("Hanning", 1), ("Blackman-Harris, 4 te
     scaled = qx.call("AllWinH", x, selector, np.nan, 1, 0)
     power = qx.call("SpectrumH", scaled)[:n // 2]
     level = 10 * np.log10(np.maximum(power, 1e-20))
-    print(f"{name:26} {level[100]:7.1f} dB at bin 100")
+    print(f"{name:26} {level[50]:7.1f} dB at bin 50")
     axes.plot(level, label=name)  # hidden
 axes.legend(frameon=False)  # hidden
 axes.set(xlabel="Bin", ylabel="Power (dB)", ylim=(-160, 0))  # hidden
