@@ -1,6 +1,9 @@
 #include "fft/execute.h"
 
+#include "fft/kernels/kernels.h"
 #include "fft/prime_stages.h"
+
+#include <algorithm>
 
 namespace qx {
 namespace {
@@ -30,8 +33,11 @@ ErrorCode RunComplexTwiddle(const FFTPlan &plan, int32_t level, DBL *re, DBL *im
     return 0;
 }
 
-// The transform of n values at level `level`, which has the factor p: p transforms of every p-th
-// value, one behind the other, then the twiddle stage over all of them.
+// The recursion. At level L a transform of n values with the factor p is p transforms of every
+// p-th value, one behind the other, and then the twiddle stage over all of them. The leaf takes the
+// p transforms of the last level but one at once.
+//
+// Complex data is handled here at any strides.
 ErrorCode RecurseComplex(const FFTPlan &plan, int32_t level, int32_t n, const DBL *inRe,
                          const DBL *inIm, DBL *outRe, DBL *outIm, ptrdiff_t inStride,
                          ptrdiff_t outStride) {
@@ -65,7 +71,7 @@ ErrorCode RunRealTwiddle(const FFTPlan &plan, int32_t level, DBL *data, ptrdiff_
     if (plan.kinds[level] != KernelFactor)
         return PrimeRealTwiddle(PrimeAt(plan, level), data, stride, m);
     const FFTStage &stage = *plan.stages[level];
-    plan.realTwiddle[level](data, stage.twiddleCos, stage.twiddleSin, stride, m);
+    stage.kernels->realLanesTwiddle(data, stage.realLanes, stride, m);
     return 0;
 }
 
@@ -82,6 +88,74 @@ ErrorCode RecurseReal(const FFTPlan &plan, int32_t level, int32_t n, const DBL *
                                  p * inStride, outStride);
     }
     return status < 0 ? status : RunRealTwiddle(plan, level, out, outStride, m);
+}
+
+// The recursion in SIMD lanes, for results that lie side by side and a leaf with kernels. Several
+// transforms of one level run together where their inputs are neighbours, so that the leaf reads
+// whole cache lines.
+struct Bundle {
+    ptrdiff_t count;
+    ptrdiff_t inStride;  // from the input of one to that of the next
+    ptrdiff_t outStride; // from the results of one to those of the next
+};
+constexpr ptrdiff_t bundleSize = 4;
+
+// What differs between complex and real data.
+struct ComplexLanesPath {
+    static constexpr ptrdiff_t width = 2; // DBL units of one value
+    static void leaf(const KernelSet &kernels, const DBL *in, DBL *out,
+                     const LeafColumns &columns) {
+        kernels.complexLanesLeaf(in, out, columns);
+    }
+    static ErrorCode twiddle(const FFTPlan &plan, int32_t level, DBL *out, int32_t m) {
+        if (plan.kinds[level] != KernelFactor)
+            return PrimeComplexTwiddle(PrimeAt(plan, level), out, out + 1, 2, m);
+        const FFTStage &stage = *plan.stages[level];
+        stage.kernels->complexLanesTwiddle(out, stage.complexLanes, m);
+        return 0;
+    }
+};
+struct RealLanesPath {
+    static constexpr ptrdiff_t width = 1;
+    static void leaf(const KernelSet &kernels, const DBL *in, DBL *out,
+                     const LeafColumns &columns) {
+        kernels.realLanesLeaf(in, out, columns);
+    }
+    static ErrorCode twiddle(const FFTPlan &plan, int32_t level, DBL *out, int32_t m) {
+        return RunRealTwiddle(plan, level, out, 1, m);
+    }
+};
+
+template <class Path>
+ErrorCode RecurseLanes(const FFTPlan &plan, int32_t level, int32_t n, const DBL *in, DBL *out,
+                       ptrdiff_t inStride, const Bundle &bundle) {
+    const int32_t p = plan.factors[level];
+    const int32_t m = n / p;
+    const ptrdiff_t block = m * Path::width;
+    ErrorCode status = 0;
+    if (level == plan.factorCount - 2) {
+        Path::leaf(*plan.stages[level + 1]->kernels, in, out,
+                   {{bundle.count, p},
+                    {bundle.inStride, inStride},
+                    {bundle.outStride, block},
+                    p * inStride});
+    } else if (bundle.count > 1) {
+        for (ptrdiff_t j = 0; j < p && status >= 0; ++j)
+            status = RecurseLanes<Path>(plan, level + 1, m, in + j * inStride, out + j * block,
+                                        p * inStride, bundle);
+    } else {
+        for (ptrdiff_t j = 0; j < p && status >= 0; j += bundleSize)
+            status =
+                RecurseLanes<Path>(plan, level + 1, m, in + j * inStride, out + j * block,
+                                   p * inStride, {std::min(bundleSize, p - j), inStride, block});
+    }
+    for (ptrdiff_t b = 0; b < bundle.count && status >= 0; ++b)
+        status = Path::twiddle(plan, level, out + b * bundle.outStride, m);
+    return status;
+}
+
+bool LeafHasKernels(const FFTPlan &plan) {
+    return plan.kinds[plan.factorCount - 1] == KernelFactor;
 }
 
 // Sums and differences of mirrored elements: half-complex form to Hartley form and back.
@@ -105,6 +179,9 @@ ErrorCode ExecuteComplex(const FFTPlan &plan, const DBL *inRe, const DBL *inIm, 
     }
     if (plan.factorCount == 1)
         return RunComplexLeaf(plan, inRe, inIm, outRe, outIm, inStride, outStride, 1);
+    if (inIm == inRe + 1 && outIm == outRe + 1 && outStride == 2 && LeafHasKernels(plan))
+        return RecurseLanes<ComplexLanesPath>(plan, 0, plan.length, inRe, outRe, inStride,
+                                              {1, 0, 0});
     return RecurseComplex(plan, 0, plan.length, inRe, inIm, outRe, outIm, inStride, outStride);
 }
 
@@ -116,6 +193,8 @@ ErrorCode ExecuteReal(const FFTPlan &plan, const DBL *in, DBL *out, ptrdiff_t in
     }
     if (plan.factorCount == 1)
         return RunRealLeaf(plan, in, out, inStride, outStride, 1);
+    if (outStride == 1 && LeafHasKernels(plan))
+        return RecurseLanes<RealLanesPath>(plan, 0, plan.length, in, out, inStride, {1, 0, 0});
     return RecurseReal(plan, 0, plan.length, in, out, inStride, outStride);
 }
 

@@ -32,7 +32,7 @@ bool Allocate(T *&table, int64_t count) {
     if (count * int64_t{sizeof(T)} > std::numeric_limits<int32_t>::max())
         return false;
     table = static_cast<T *>(std::malloc(static_cast<std::size_t>(count) * sizeof(T)));
-    return table != nullptr;
+    return table != nullptr || count == 0;
 }
 
 void Append(FFTPlan *plan, int32_t factor, int32_t kind) {
@@ -100,6 +100,15 @@ bool BuildTwiddles(FFTStage *stage, int32_t p, int32_t n) {
             roots.advance();
         }
     }
+    return true;
+}
+
+bool BuildLanes(FFTStage *stage, int32_t p, int32_t m) {
+    if (!Allocate(stage->complexLanes, ComplexLanesSize(p, m)) ||
+        !Allocate(stage->realLanes, RealLanesSize(p, m)))
+        return false;
+    FillComplexLanes(*stage, p, m, stage->complexLanes);
+    FillRealLanes(*stage, p, m, stage->realLanes);
     return true;
 }
 
@@ -174,19 +183,22 @@ bool BuildRader(FFTStage *stage, int32_t p) {
     return built;
 }
 
+bool BuildStage(FFTStage *stage, int32_t p, int32_t kind, int32_t n) {
+    const bool isLeaf = n == p;
+    if (kind == KernelFactor)
+        stage->kernels = &KernelsOf(p);
+    return (isLeaf || BuildTwiddles(stage, p, n)) &&
+           (isLeaf || kind != KernelFactor || BuildLanes(stage, p, n / p)) &&
+           (kind != DirectPrime || BuildRoots(stage, p)) &&
+           (kind != RaderPrime || BuildRader(stage, p));
+}
+
 bool BuildStages(FFTPlan *plan) {
     int32_t n = plan->length;
     for (int32_t s = 0; s < plan->factorCount; ++s) {
         const int32_t p = plan->factors[s];
         plan->stages[s] = static_cast<FFTStage *>(std::calloc(1, sizeof(FFTStage)));
-        FFTStage *const stage = plan->stages[s];
-        if (stage == nullptr)
-            return false;
-        if (s + 1 < plan->factorCount && !BuildTwiddles(stage, p, n))
-            return false;
-        if (plan->kinds[s] == DirectPrime && !BuildRoots(stage, p))
-            return false;
-        if (plan->kinds[s] == RaderPrime && !BuildRader(stage, p))
+        if (plan->stages[s] == nullptr || !BuildStage(plan->stages[s], p, plan->kinds[s], n))
             return false;
         n /= p;
     }
@@ -211,7 +223,7 @@ void Dismantle(FFTPlan *plan) {
         if (stage == nullptr)
             continue;
         for (DBL *table : {stage->rootCos, stage->rootSin, stage->twiddleCos, stage->twiddleSin,
-                           stage->raderCos, stage->raderSin})
+                           stage->raderCos, stage->raderSin, stage->complexLanes, stage->realLanes})
             std::free(table);
         std::free(stage->raderGather);
         std::free(stage->raderScatter);

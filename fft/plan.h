@@ -5,6 +5,7 @@
 #include "qx/fft.h"
 #include "qx/types.h"
 
+#include <cstddef>
 #include <cstdint>
 
 namespace qx {
@@ -13,16 +14,18 @@ namespace qx {
 //
 // A leaf computes `count` transforms: number i reads element i + j count of the input, j from 0
 // to p - 1, and writes its p results to the elements i p onward of the output.
-typedef void (*RealLeaf)(const DBL *in, DBL *out, int32_t inStride, int32_t outStride,
+typedef void (*RealLeaf)(const DBL *in, DBL *out, std::ptrdiff_t inStride, std::ptrdiff_t outStride,
                          int32_t count);
 typedef void (*ComplexLeaf)(const DBL *inRe, const DBL *inIm, DBL *outRe, DBL *outIm,
-                            int32_t inStride, int32_t outStride, int32_t count);
+                            std::ptrdiff_t inStride, std::ptrdiff_t outStride, int32_t count);
 // A twiddle kernel combines, in place, p transforms of length m, block after block, into one of
 // length p m. The twiddles are those of the stage.
-typedef void (*RealTwiddle)(DBL *data, const DBL *twiddleCos, const DBL *twiddleSin, int32_t stride,
-                            int32_t m);
+typedef void (*RealTwiddle)(DBL *data, const DBL *twiddleCos, const DBL *twiddleSin,
+                            std::ptrdiff_t stride, int32_t m);
 typedef void (*ComplexTwiddle)(DBL *re, DBL *im, const DBL *twiddleCos, const DBL *twiddleSin,
-                               int32_t stride, int32_t m);
+                               std::ptrdiff_t stride, int32_t m);
+
+struct KernelSet;
 
 // How the p-point transform of a factor p is done: by a kernel of straight-line code, as a plain
 // sum (a prime below 50 that has no kernel), or by Rader's algorithm (any other prime).
@@ -42,6 +45,10 @@ struct FFTStage {
     FFTPlan *raderPlan;
     DBL *raderCos, *raderSin;
     int32_t *raderGather, *raderScatter;
+    // Factor with kernels: all of them, and for every stage but the last its twiddles once more, in
+    // the order in which the lanes of the complex and of the real kernels read them.
+    const qx::KernelSet *kernels;
+    DBL *complexLanes, *realLanes;
 };
 
 // Everything that a transform of one length needs. Read-only from its creation to its release,

@@ -6,11 +6,6 @@
 #include <cstddef>
 #include <cstring>
 
-// Four lanes without AVX are two registers; that the calling convention for them depends on the
-// instruction set is no matter, since all of it is inlined.
-#pragma GCC diagnostic push
-#pragma GCC diagnostic ignored "-Wpsabi"
-
 namespace qx {
 
 // SIMD over independent elements: Lanes<N> holds N doubles, and every operation does in each lane
@@ -119,7 +114,5 @@ public:
 };
 
 } // namespace qx
-
-#pragma GCC diagnostic pop
 
 #endif

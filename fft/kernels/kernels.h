@@ -3,21 +3,52 @@
 
 #include "fft/plan.h"
 
+#include <cstddef>
+
 namespace qx {
 
 // The radices with kernels of their own, in the order in which lengths are divided by them.
 inline constexpr int32_t kernelRadices[] = {10, 43, 41, 37, 32, 31, 29, 19, 18, 17, 16,
                                             14, 13, 11, 9,  8,  7,  5,  4,  3,  2};
 
+// The columns of a leaf: a rectangle of transforms, number (a, b) with its input at
+// a inStride[0] + b inStride[1] and its output at a outStride[0] + b outStride[1]. Value j of a
+// transform is j legStride behind its first.
+struct LeafColumns {
+    std::ptrdiff_t count[2];
+    std::ptrdiff_t inStride[2];
+    std::ptrdiff_t outStride[2];
+    std::ptrdiff_t legStride;
+};
+
+// The kernels of one radix. The first four take any strides. The others run in SIMD lanes: complex
+// data is interleaved, results lie side by side, and twiddles come from the lane tables. Both give
+// the same bits.
 struct KernelSet {
     RealLeaf realLeaf;
     RealTwiddle realTwiddle;
     ComplexLeaf complexLeaf;
     ComplexTwiddle complexTwiddle;
+
+    void (*realLanesLeaf)(const DBL *in, DBL *out, const LeafColumns &columns);
+    void (*realLanesTwiddle)(DBL *data, const DBL *lanes, std::ptrdiff_t stride, std::ptrdiff_t m);
+    void (*complexLanesLeaf)(const DBL *in, DBL *out, const LeafColumns &columns);
+    void (*complexLanesTwiddle)(DBL *data, const DBL *lanes, std::ptrdiff_t m);
 };
 
 // The kernels of one of kernelRadices.
 const KernelSet &KernelsOf(int32_t radix);
+template <int P>
+const KernelSet &KernelsFor();
+
+// The lane tables hold the twiddles of a stage with factor p in the order in which the kernels read
+// them: block after block of columns, in a block for each j from 1 to p - 1 the cosines of all
+// lanes, then the sines. Lanes behind the last column repeat it. The complex table starts at column
+// 0, the real one at column 1 and ends at (m - 1) / 2, for the rest mirrors it.
+int64_t ComplexLanesSize(int32_t p, int32_t m);
+int64_t RealLanesSize(int32_t p, int32_t m);
+void FillComplexLanes(const FFTStage &stage, int32_t p, int32_t m, DBL *lanes);
+void FillRealLanes(const FFTStage &stage, int32_t p, int32_t m, DBL *lanes);
 
 } // namespace qx
 
