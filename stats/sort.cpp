@@ -45,20 +45,24 @@ void SiftDown(DBL *a, std::ptrdiff_t root, std::ptrdiff_t n) {
     a[root] = value;
 }
 
-// Moves the pivot to a[0]: the median of three, for a long range of three medians of three.
+// Moves the pivot to a[0]: the median of three, for a long range of three medians of three that
+// lie evenly over the range, so that neither rising and falling data nor long runs mislead it.
 void ChoosePivot(DBL *a, std::ptrdiff_t n) {
-    const std::ptrdiff_t middle = n / 2;
     const auto median = [a](std::ptrdiff_t i, std::ptrdiff_t j, std::ptrdiff_t k) {
         OrderPair(&a[i], &a[j]);
         OrderPair(&a[j], &a[k]);
         OrderPair(&a[i], &a[j]);
     };
     if (n > 128) {
-        median(1, middle - 1, n - 2);
-        median(2, middle + 1, n - 3);
-        median(middle - 1, middle, middle + 1);
+        const std::ptrdiff_t step = n / 10;
+        median(step, 2 * step, 3 * step);
+        median(4 * step, 5 * step, 6 * step);
+        median(7 * step, 8 * step, 9 * step);
+        median(2 * step, 5 * step, 8 * step);
+        Swap(&a[0], &a[5 * step]);
+    } else {
+        median(n / 2, 0, n - 1);
     }
-    median(middle, 0, n - 1);
 }
 
 // Splits a[1..n-1] by the pivot in a[0] and puts that between the parts; returns its place.
