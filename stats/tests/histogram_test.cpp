@@ -136,7 +136,8 @@ General GeneralOf(const std::vector<double> &samples, const std::vector<HistInte
     const DBLArray x(samples);
     const std::size_t bytes = intervals.size() * sizeof(HistInterval);
     const Array1D<qx::ElementType::U8> records(static_cast<int32_t>(bytes));
-    std::memcpy(records.data(), intervals.data(), bytes);
+    if (bytes > 0)
+        std::memcpy(records.data(), intervals.data(), bytes);
     (*records.handle())->dimSize = static_cast<int32_t>(intervals.size());
     const I32Array counts(9);
     General result = {{}, {7, 7, 7}, 1};
