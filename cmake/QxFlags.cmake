@@ -3,6 +3,9 @@
 add_library(qxflags INTERFACE)
 target_compile_options(qxflags INTERFACE -ffp-contract=off -fno-math-errno -fvisibility=hidden
     $<$<COMPILE_LANGUAGE:CXX>:-fvisibility-inlines-hidden> -Wall -Wextra -Wshadow)
+# Warnings of what is meant: element types lose their byte alignment as template arguments, and
+# vectors wider than the registers pass between functions of one build only.
+target_compile_options(qxflags INTERFACE $<$<COMPILE_LANGUAGE:CXX>:-Wno-ignored-attributes> -Wno-psabi)
 
 # Four lanes without AVX are passed in another way than with it; all of frame/lanes.h is inlined.
 target_compile_options(qxflags INTERFACE -Wno-psabi)
@@ -14,12 +17,12 @@ foreach(function IN ITEMS sin cos tan asin acos atan atan2 sinh cosh tanh exp ex
 endforeach()
 
 if(CMAKE_SIZEOF_VOID_P EQUAL 4)
-    # The compiler warns of the byte alignment that element types lose as template arguments.
-    target_compile_options(qxflags INTERFACE -msse2 -mfpmath=sse -mstackrealign
-        $<$<COMPILE_LANGUAGE:CXX>:-Wno-ignored-attributes>)
+    target_compile_options(qxflags INTERFACE -msse2 -mfpmath=sse -mstackrealign)
 endif()
 if(NOT QX_ARCH STREQUAL "baseline")
-    target_compile_options(qxflags INTERFACE -march=${QX_ARCH})
+    # The compiler's vectoriser fuses a multiplication with an alternating addition whatever
+    # -ffp-contract says (g++ 12), so it must not find such instructions. AVX-512 has its own.
+    target_compile_options(qxflags INTERFACE -march=${QX_ARCH} -mno-fma -mno-avx512f)
 endif()
 if(QX_SANITIZE)
     target_compile_options(qxflags INTERFACE -fsanitize=${QX_SANITIZE} -fno-omit-frame-pointer

@@ -188,6 +188,18 @@ inline void PrintTo(const Recipe &recipe, std::ostream *stream) { *stream << rec
 
 // All recipes, in the order of their families.
 const std::vector<Recipe> &AllRecipes();
+
+// One hash per export over all its outputs at all the sizes of its recipes.
+struct ExportHash {
+    uint64_t hash = 0;
+    bool mayDiffer = false; // from processor to processor
+};
+typedef std::function<int32_t(const Recipe &, Call &)> Caller;
+std::map<std::string, ExportHash>
+HashEveryExport(const Caller &caller = [](const Recipe &recipe, Call &call) {
+    return recipe.run(call);
+});
+
 // Exports that are tested by hand, with the reason.
 struct Exempt {
     const char *name;
