@@ -50,6 +50,22 @@ struct Element<ElementType::CDB> {
     typedef ::CDB type;
 };
 
+// Elements stand at addresses that their C++ type does not promise, and the algorithms of the
+// standard library would forget that. These do not.
+
+inline void Fill(DBL *to, std::ptrdiff_t count, double value) {
+    for (std::ptrdiff_t i = 0; i < count; ++i)
+        to[i] = value;
+}
+
+inline void Reverse(DBL *a, std::ptrdiff_t count) {
+    for (std::ptrdiff_t i = 0, j = count - 1; i < j; ++i, --j) {
+        const double held = a[i];
+        a[i] = a[j];
+        a[j] = held;
+    }
+}
+
 } // namespace qx
 
 #endif

@@ -172,9 +172,4 @@ bool IsDescending(const DBL *a, std::ptrdiff_t n) {
     return n > 1 || a[0] == a[0];
 }
 
-void Reverse(DBL *a, std::ptrdiff_t n) {
-    for (std::ptrdiff_t i = 0; i < n - 1 - i; ++i)
-        Swap(&a[i], &a[n - 1 - i]);
-}
-
 } // namespace qx

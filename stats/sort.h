@@ -1,7 +1,7 @@
 #ifndef QX_STATS_SORT_H
 #define QX_STATS_SORT_H
 
-#include "qx/types.h"
+#include "frame/elements.h"
 
 #include <cstddef>
 
@@ -10,8 +10,6 @@ namespace qx {
 // No element is smaller, or none greater, than the one before it; false where NaN is among them.
 bool IsAscending(const DBL *a, std::ptrdiff_t n);
 bool IsDescending(const DBL *a, std::ptrdiff_t n);
-
-void Reverse(DBL *a, std::ptrdiff_t n);
 
 // Sorts a[0..n-1], which holds no NaN, ascending: quicksort with a partition free of branches
 // (S. Edelkamp, A. Weiss: BlockQuicksort, 2016), insertion sort for short ranges, heapsort where

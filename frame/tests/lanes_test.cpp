@@ -37,7 +37,8 @@ TYPED_TEST(LanesTest, DoesInEachLaneWhatOneDoubleWouldDo) {
         const double product = sum * p;
         const double quotient = q / -p;
         const double difference = product - quotient;
-        EXPECT_EQ(y.data()[i], difference + 0.1);
+        const double got = y.data()[i];
+        EXPECT_EQ(got, difference + 0.1);
         EXPECT_EQ(b[i], q);
     }
     const L zero = L(-0.0);

@@ -10,5 +10,6 @@
 #include "qx/stats.h"
 #include "qx/transforms.h"
 #include "qx/types.h"
+#include "qx/windows.h"
 
 #endif

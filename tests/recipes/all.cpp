@@ -10,6 +10,7 @@ const std::vector<Recipe> &AllRecipes() {
                  FFTRecipes(),
                  SpectraRecipes(),
                  TransformRecipes(),
+                 WindowRecipes(),
              })
             recipes.insert(recipes.end(), family.begin(), family.end());
         return recipes;

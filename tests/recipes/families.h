@@ -9,6 +9,7 @@ std::vector<Recipe> BasicStatisticsRecipes();
 std::vector<Recipe> FFTRecipes();
 std::vector<Recipe> SpectraRecipes();
 std::vector<Recipe> TransformRecipes();
+std::vector<Recipe> WindowRecipes();
 
 } // namespace qx::test
 

@@ -1,0 +1,25 @@
+#ifndef QX_WINDOWS_CONSTANTS_H
+#define QX_WINDOWS_CONSTANTS_H
+
+#include "qx/errors.h"
+#include "qx/windows.h"
+
+namespace qx {
+
+// Both constants become the quiet NaN.
+void SetConstantsNaN(WindowConstants *constants);
+
+// The stored constants of a cosine sum and of selectors 31 to 34. ErrInvalidSelector for others.
+ErrorCode WindowConstantsFromTable(int32_t selector, WindowConstants *constants);
+
+// cg = sum(w) / n and enbw = n sum(w^2) / sum(w)^2, NaN for a window of zeros. ErrEmptyInput.
+ErrorCode MeasureWindowConstants(const DBL *w, int32_t n, WindowConstants *constants);
+
+// The constants of a named window of n samples: stored ones for selectors 0 to 9 and 11, else
+// measured. `param` as the window's own routine takes it. ErrEmptyInput, ErrInvalidSelector.
+ErrorCode WindowConstantsByName(int32_t n, int32_t selector, double param,
+                                WindowConstants *constants);
+
+} // namespace qx
+
+#endif

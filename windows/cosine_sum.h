@@ -1,0 +1,31 @@
+#ifndef QX_WINDOWS_COSINE_SUM_H
+#define QX_WINDOWS_COSINE_SUM_H
+
+#include "qx/errors.h"
+#include "windows/signal.h"
+
+namespace qx {
+
+constexpr int32_t maxCosineTerms = 7; // of the named windows
+
+struct CosineCoefficients {
+    int32_t count; // 0 for a selector that is no cosine sum
+    double a[maxCosineTerms];
+};
+const CosineCoefficients &CosineWindowCoefs(int32_t selector);
+
+// x[i] times the sum over k of (-1)^k a[k] cos(2 pi k i / n) / d, with d = a[0] if `scaled` is
+// non-zero, else 1. One sine pair per term, then a rotation per sample in the form "old value
+// minus a correction", which keeps the sum accurate over long arrays (Singleton: On computing
+// the fast Fourier transform, 1967, for the recurrence).
+// ErrEmptyInput for n < 1, then, except for n = 1, for m < 1.
+template <class Signal>
+ErrorCode ApplyCosineSumWindow(Signal x, int32_t n, const DBL *a, int32_t m, int32_t scaled);
+
+// ErrEmptyInput for n < 1, ErrInvalidSelector for a selector without coefficients.
+template <class Signal>
+ErrorCode ApplyCosineWindowBySelector(Signal x, int32_t n, int32_t selector, int32_t scaled);
+
+} // namespace qx
+
+#endif
