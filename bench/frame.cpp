@@ -1,0 +1,116 @@
+// Scratch memory from the enabled workspace against malloc and free of the same sizes: request
+// and release in turn, and runs of eight requests released newest first, by one thread and four.
+
+#include "bench/timing.h"
+#include "frame/scratch.h"
+#include "frame/workspace.h"
+
+#include <atomic>
+#include <barrier>
+#include <cstdint>
+#include <cstdlib>
+#include <string>
+#include <thread>
+
+// The host that the workspace registers its sweep with: this program.
+extern "C" {
+__attribute__((visibility("default"))) extern const int32_t gQXRTVersion;
+const int32_t gQXRTVersion = 1;
+__attribute__((visibility("default"))) int32_t HostRegisterSweep(int32_t (*)(void *), void *,
+                                                                 int32_t) {
+    return 0;
+}
+__attribute__((visibility("default"))) int32_t HostBlockReshape(int32_t, int32_t, void *, int32_t) {
+    return 1;
+}
+}
+
+namespace {
+
+using namespace qx::bench;
+
+constexpr int pairs = 20000;
+
+// A block that is not the last keeps its bytes until those above it are released, so threads that
+// never all stand still together can fill the region.
+std::atomic<int64_t> refused = 0;
+
+struct Workspace {
+    static void *request(int32_t size) {
+        void *block;
+        if (qx::ScratchAlloc(&block, size) != 0)
+            ++refused;
+        return block;
+    }
+    static void release(void *block) { qx::ScratchFree(block); }
+};
+
+struct Heap {
+    static void *request(int32_t size) { return std::malloc(static_cast<std::size_t>(size)); }
+    static void release(void *block) { std::free(block); }
+};
+
+template <class Source, int depth>
+void RequestAndRelease(int32_t size) {
+    void *blocks[depth];
+    for (int i = 0; i < pairs; i += depth) {
+        for (void *&block : blocks) {
+            block = Source::request(size);
+            if (block != nullptr)
+                *static_cast<volatile char *>(block) = 1;
+        }
+        for (int j = depth; j-- > 0;)
+            Source::release(blocks[j]);
+    }
+}
+
+// Seconds for one pair, as each of the threads sees it.
+template <class Source, int depth>
+double SecondsPerPair(int threads, int32_t size) {
+    std::vector<double> seconds(static_cast<std::size_t>(threads));
+    std::barrier start(threads);
+    std::vector<std::thread> crew;
+    for (double &taken : seconds)
+        crew.emplace_back([&] {
+            RequestAndRelease<Source, depth>(size);
+            start.arrive_and_wait();
+            taken = SecondsOf(1, [&] { RequestAndRelease<Source, depth>(size); });
+        });
+    for (std::thread &thread : crew)
+        thread.join();
+    return Median(seconds) / pairs;
+}
+
+template <int depth>
+void Compare(int threads, Ratios &all) {
+    constexpr int rounds = 15;
+    for (int32_t size = 16; size <= 65536; size *= 4) {
+        std::vector<double> ours, peers;
+        for (int round = 0; round < rounds; ++round) {
+            ours.push_back(SecondsPerPair<Workspace, depth>(threads, size));
+            peers.push_back(SecondsPerPair<Heap, depth>(threads, size));
+        }
+        const double ratio = Median(ours) / Median(peers);
+        std::printf("scratch, %d thread%s, runs of %d, %5d bytes %8.1f ns  ratio %5.2f\n", threads,
+                    threads > 1 ? "s" : " ", depth, size, Median(ours) * 1e9, ratio);
+        all.add(ratio);
+    }
+}
+
+} // namespace
+
+int main() {
+    if (qx::analysisWorkspace.reserve(1U << 30) != 0 || qx::analysisWorkspace.setEnabled(true) != 0)
+        return 1;
+    if (!qx::analysisWorkspace.isEnabled())
+        return 1;
+    for (const int threads : {1, 4}) {
+        Ratios all("scratch, " + std::to_string(threads) + " threads");
+        Compare<1>(threads, all);
+        Compare<8>(threads, all);
+        all.print();
+    }
+    std::printf("requests refused by the full region: %lld\n",
+                static_cast<long long>(refused.load()));
+    return 0;
+}
