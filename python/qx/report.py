@@ -289,7 +289,7 @@ def power(recording):
                    rows, [_svg(plt, figure)])
 
 
-SECTIONS = [overview, statistics, histogram, amplitudes]
+SECTIONS = [overview, statistics, histogram, amplitudes, power]
 
 
 # Output

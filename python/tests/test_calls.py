@@ -133,7 +133,6 @@ class Concurrency(unittest.TestCase):
         self.assertEqual(found, expected)
 
 
-@unittest.skipUnless("ReOXFFTH80" in qx.names(), "no transform yet")
 class Plans(unittest.TestCase):
     def test_transforms_keep_their_plans(self):
         rng = np.random.default_rng(3)
