@@ -15,6 +15,7 @@ import io
 import os
 import re
 import sys
+import textwrap
 import traceback
 from pathlib import Path
 
@@ -46,22 +47,21 @@ def marked(text):
 
 def prose(text):
     """Paragraphs; blocks of indented lines keep their layout, and codes begin a paragraph."""
-    parts, lines = [], []
+    parts, lines, table = [], [], False
 
     def close():
-        if lines:
-            if all(line.startswith("    ") for line in lines):
-                parts.append(f"<pre>{html.escape(chr(10).join(line[4:] for line in lines))}</pre>")
-            else:
-                parts.append(f"<p>{marked(' '.join(map(str.strip, lines)))}</p>")
-            lines.clear()
+        if lines and table:
+            parts.append(f"<pre>{html.escape(textwrap.dedent(chr(10).join(lines)))}</pre>")
+        elif lines:
+            parts.append(f"<p>{marked(' '.join(map(str.strip, lines)))}</p>")
+        lines.clear()
 
     for line in text.split("\n"):
-        indented = line.startswith("    ")
-        if lines and (re.match(r"-2\d{4}\b|Codes:", line) or not line
-                      or indented != lines[-1].startswith("    ")):
+        indented = line.startswith("  " if lines and table else "    ")
+        if not line or indented != table or re.match(r"-2\d{4}\b|Codes:", line):
             close()
         if line:
+            table = indented
             lines.append(line)
     close()
     return "".join(parts)

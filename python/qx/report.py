@@ -305,7 +305,7 @@ table { border-collapse: collapse; } td, th { padding: .22em 1.4em .22em 0; text
      border-bottom: 1px solid #eef1f5; } td.value { text-align: right; white-space: nowrap;
      font-variant-numeric: tabular-nums; padding-right: .5em; } td.export { color: #5b6b7d;
      font-family: "DejaVu Sans Mono", Consolas, monospace; font-size: .86em; }
-footer { margin-top: 3em; color: #8795a6; font-size: .85em; }
+table + figure { margin-top: 1em; } footer { margin-top: 3em; color: #8795a6; font-size: .85em; }
 """
 
 
