@@ -145,6 +145,9 @@ class Refusing(unittest.TestCase):
             tree(folder, shapes=SHAPES, qx='#include "qx/other.h"\n')
             with self.assertRaisesRegex(catalogue.HeaderError, "qx.h does not include"):
                 catalogue.read_headers(folder)
+        with tempfile.TemporaryDirectory() as folder:
+            tree(folder, shapes=SHAPES, qx='#include "qx/all.h"\n', all='#include "qx/shapes.h"\n')
+            self.assertEqual(len(catalogue.read_headers(folder)["exports"]), 3)
 
     def test_the_command_fails(self):
         with tempfile.TemporaryDirectory() as folder:

@@ -308,13 +308,24 @@ def codes_of(path):
     return {name: int(number) for name, number in pairs}
 
 
+def headers_of(folder, name):
+    """The headers that a header includes, by any number of steps."""
+    found, left = set(), [name]
+    while left:
+        path = folder / left.pop()
+        if path.name not in found and path.exists():
+            found.add(path.name)
+            left += re.findall(r'#include "qx/([^"]+)"', path.read_text("utf-8"))
+    return found
+
+
 def read_headers(include):
     """The whole catalogue; `include` is the folder that holds qx/."""
     folder = Path(include) / "qx"
     codes = codes_of(folder / "errors.h")
     types, exports, seen = Types(), [], {}
     introductions = []
-    umbrella = (folder / "qx.h").read_text("utf-8") if (folder / "qx.h").exists() else None
+    reached = headers_of(folder, "qx.h") if (folder / "qx.h").exists() else None
     families = sorted(p for p in folder.glob("*.h") if p.name not in NOT_A_FAMILY)
     parsed = [(path, list(statements_of(path, path.read_text("utf-8"))))
               for path in [folder / "types.h", *families]]
@@ -323,7 +334,7 @@ def read_headers(include):
             if statement.words[0] == "typedef":
                 types.read(path, statement)
     for path, statements in parsed[1:]:
-        if umbrella is not None and f'"qx/{path.name}"' not in umbrella:
+        if reached is not None and path.name not in reached:
             raise HeaderError(path, 1, "qx.h does not include this header")
         first = next((t for t in tokens_of(path.read_text("utf-8")) if t.text.startswith("/*")), None)
         introductions.append({"name": path.stem, "header": f"qx/{path.name}",
