@@ -1,0 +1,1 @@
+qx_bench(fft2d SOURCES fft2d.cpp PEERS fftw3)

@@ -1,0 +1,107 @@
+// Two-dimensional transforms against FFTW, one thread, plans made outside the timed loop.
+
+#include "bench/host_memory.h"
+#include "bench/timing.h"
+#include "fft/plan.h"
+#include "fft/two_dimensional.h"
+
+#include <cstdint>
+
+#ifdef QX_PEER_FFTW3
+#include <fftw3.h>
+#endif
+
+namespace {
+
+using namespace qx::bench;
+
+#ifdef QX_PEER_FFTW3
+class Peer {
+public:
+    Peer(int32_t rows, int32_t cols, bool real, unsigned effort)
+        : in_(fftw_alloc_complex(std::size_t(rows) * cols)),
+          out_(fftw_alloc_complex(std::size_t(rows) * cols)) {
+        double *const values = reinterpret_cast<double *>(in_);
+        plan_ = real ? fftw_plan_dft_r2c_2d(rows, cols, values, out_, effort)
+                     : fftw_plan_dft_2d(rows, cols, in_, out_, FFTW_FORWARD, effort);
+        for (std::size_t i = 0; i < 2 * std::size_t(rows) * cols; ++i)
+            values[i] = static_cast<double>(i * 7919 % 1024) / 512 - 1;
+    }
+    ~Peer() {
+        fftw_destroy_plan(plan_);
+        fftw_free(in_);
+        fftw_free(out_);
+    }
+    Peer(const Peer &) = delete;
+    Peer &operator=(const Peer &) = delete;
+    void operator()() const { fftw_execute(plan_); }
+
+private:
+    fftw_complex *in_, *out_;
+    fftw_plan plan_;
+};
+#endif
+
+struct Totals {
+    Ratios estimate;
+    Ratios measure;
+};
+
+template <class Ours>
+void Compare(int32_t rows, int32_t cols, bool real, const Ours &ours, Totals &totals) {
+    std::printf("%5d x %5d %-8s", rows, cols, real ? "real" : "complex");
+#ifdef QX_PEER_FFTW3
+    const Peer estimate(rows, cols, real, FFTW_ESTIMATE);
+    const Peer measure(rows, cols, real, FFTW_MEASURE);
+    const auto times = MedianTimes(ours, estimate, measure);
+    totals.estimate.add(times[0] / times[1]);
+    totals.measure.add(times[0] / times[2]);
+    std::printf("%12.2f us %5.2f %5.2f\n", times[0] * 1e6, times[0] / times[1],
+                times[0] / times[2]);
+#else
+    std::printf("%12.2f us\n", MedianTimes(ours)[0] * 1e6);
+#endif
+    std::fflush(stdout);
+}
+
+} // namespace
+
+int main() {
+    Totals complex{Ratios("2-D complex, over FFTW estimate"),
+                   Ratios("2-D complex, over FFTW measure")};
+    Totals real{Ratios("2-D real, over FFTW estimate"), Ratios("2-D real, over FFTW measure")};
+    std::printf("time of ours; ratios to FFTW with FFTW_ESTIMATE and FFTW_MEASURE\n");
+    for (const auto &[rows, cols] : {std::pair{64, 64},
+                                     {128, 128},
+                                     {100, 120},
+                                     {256, 256},
+                                     {480, 640},
+                                     {512, 512},
+                                     {1000, 1000},
+                                     {1024, 1024}}) {
+        const std::size_t count = std::size_t(rows) * cols;
+        const HostMemory in(2 * count);
+        const HostMemory out(2 * count);
+        const qx::PlanReference rowPlan(cols);
+        const qx::PlanReference columnPlan(rows);
+        const qx::MatrixRegion whole{rows, cols, 0, 0, rows, cols};
+        Compare(
+            rows, cols, false,
+            [&] {
+                qx::FFT2DComplexForward(rowPlan.get(), columnPlan.get(), in.complexData(), whole, 0,
+                                        out.complexData());
+            },
+            complex);
+        Compare(
+            rows, cols, true,
+            [&] {
+                qx::FFT2DRealForward(rowPlan.get(), columnPlan.get(), in.data(), whole, 0,
+                                     out.complexData());
+            },
+            real);
+    }
+    for (const Totals *totals : {&complex, &real}) {
+        totals->estimate.print();
+        totals->measure.print();
+    }
+}

@@ -1,0 +1,1 @@
+qx_bench(spectra SOURCES spectra.cpp)

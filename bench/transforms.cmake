@@ -1,0 +1,1 @@
+qx_bench(transforms SOURCES transforms.cpp PEERS fftw3)

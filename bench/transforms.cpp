@@ -1,0 +1,90 @@
+// The cosine transform of even lengths against FFTW's REDFT10, and its inverse against REDFT01;
+// one thread, plans made outside the timed loop.
+
+#include "bench/host_memory.h"
+#include "bench/timing.h"
+#include "fft/plan.h"
+#include "transforms/dct.h"
+
+#include <cstdint>
+
+#ifdef QX_PEER_FFTW3
+#include <fftw3.h>
+#endif
+
+namespace {
+
+using namespace qx::bench;
+
+#ifdef QX_PEER_FFTW3
+class Peer {
+public:
+    Peer(int32_t n, fftw_r2r_kind kind, unsigned effort)
+        : in_(fftw_alloc_real(n)), out_(fftw_alloc_real(n)),
+          plan_(fftw_plan_r2r_1d(n, in_, out_, kind, effort)) {
+        for (int32_t i = 0; i < n; ++i)
+            in_[i] = static_cast<double>(i * 7919 % 1024) / 512 - 1;
+    }
+    ~Peer() {
+        fftw_destroy_plan(plan_);
+        fftw_free(in_);
+        fftw_free(out_);
+    }
+    Peer(const Peer &) = delete;
+    Peer &operator=(const Peer &) = delete;
+    void operator()() const { fftw_execute(plan_); }
+
+private:
+    double *in_, *out_;
+    fftw_plan plan_;
+};
+#endif
+
+struct Totals {
+    Ratios forwardEstimate{"DCT, over FFTW estimate"};
+    Ratios forwardMeasure{"DCT, over FFTW measure"};
+    Ratios inverseMeasure{"inverse DCT, over FFTW measure"};
+};
+
+void Compare(int32_t n, Totals &totals) {
+    const HostMemory in(n);
+    const HostMemory out(n);
+    const HostMemory work(qx::DCTInverseWork(n));
+    const qx::PlanReference plan(static_cast<int32_t>(qx::DCTPlanLength(n)));
+    const auto forward = [&] {
+        qx::DCTForward(plan.get(), in.data(), n, out.data(), 1, 1, n, work.data());
+    };
+    const auto inverse = [&] {
+        qx::DCTInverse(in.data(), out.data(), 1, 1, n, work.data(), plan.get());
+    };
+#ifdef QX_PEER_FFTW3
+    const Peer estimate(n, FFTW_REDFT10, FFTW_ESTIMATE);
+    const Peer measure(n, FFTW_REDFT10, FFTW_MEASURE);
+    const Peer inverseMeasure(n, FFTW_REDFT01, FFTW_MEASURE);
+    const auto times = MedianTimes(forward, estimate, measure);
+    const auto inverseTimes = MedianTimes(inverse, inverseMeasure);
+    totals.forwardEstimate.add(times[0] / times[1]);
+    totals.forwardMeasure.add(times[0] / times[2]);
+    totals.inverseMeasure.add(inverseTimes[0] / inverseTimes[1]);
+    std::printf("%8d DCT %10.3f us %5.2f %5.2f   inverse %10.3f us %5.2f\n", n, times[0] * 1e6,
+                times[0] / times[1], times[0] / times[2], inverseTimes[0] * 1e6,
+                inverseTimes[0] / inverseTimes[1]);
+#else
+    const auto times = MedianTimes(forward, inverse);
+    std::printf("%8d DCT %10.3f us   inverse %10.3f us\n", n, times[0] * 1e6, times[1] * 1e6);
+#endif
+    std::fflush(stdout);
+}
+
+} // namespace
+
+int main() {
+    Totals totals;
+    std::printf("time of ours; ratios to FFTW with FFTW_ESTIMATE and FFTW_MEASURE\n");
+    for (int32_t n : {8,    16,   32,   50,    64,    100,   128,    256,    360,     512,    1000,
+                      1024, 2048, 4096, 10000, 16384, 65536, 100000, 262144, 1000000, 1048576})
+        Compare(n, totals);
+    totals.forwardEstimate.print();
+    totals.forwardMeasure.print();
+    totals.inverseMeasure.print();
+}
