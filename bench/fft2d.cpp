@@ -48,7 +48,8 @@ struct Totals {
 };
 
 template <class Ours>
-void Compare(int32_t rows, int32_t cols, bool real, const Ours &ours, Totals &totals) {
+void Compare(int32_t rows, int32_t cols, bool real, const Ours &ours,
+             [[maybe_unused]] Totals &totals) {
     std::printf("%5d x %5d %-8s", rows, cols, real ? "real" : "complex");
 #ifdef QX_PEER_FFTW3
     const Peer estimate(rows, cols, real, FFTW_ESTIMATE);

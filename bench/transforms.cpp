@@ -46,7 +46,7 @@ struct Totals {
     Ratios inverseMeasure{"inverse DCT, over FFTW measure"};
 };
 
-void Compare(int32_t n, Totals &totals) {
+void Compare(int32_t n, [[maybe_unused]] Totals &totals) {
     const HostMemory in(n);
     const HostMemory out(n);
     const HostMemory work(qx::DCTInverseWork(n));

@@ -11,30 +11,45 @@ namespace qx {
 
 // Columns of a row-major matrix, copied out side by side so that a transform finds each of them
 // contiguous. Several are moved at a time, because a fetched cache line holds several.
-constexpr int32_t ColumnsAtOnce = 8;
+constexpr int32_t ColumnsAtOnce = 16;
 
-// The distance between copied columns. The spare line keeps columns of a power-of-two length
-// from falling into the same cache set.
-inline int64_t ColumnPitch(int32_t rows) { return int64_t{rows} + 8; }
+// The distance between rows or columns of n values in work memory. The spare line keeps those of
+// a power-of-two length from falling into the same cache set.
+inline int64_t PaddedPitch(int32_t n) { return int64_t{n} + 8; }
 
 inline int32_t ColumnsInBlock(int32_t first, int32_t cols) {
     return std::min(ColumnsAtOnce, cols - first);
 }
 
+// Calls body(row, column) for every element of a block, with the usual number of columns known
+// to the compiler.
+template <class Body>
+void ForEachInBlock(int32_t rows, int32_t count, const Body &body) {
+    if (count == ColumnsAtOnce) {
+        for (int32_t r = 0; r < rows; ++r)
+            for (int32_t c = 0; c < ColumnsAtOnce; ++c)
+                body(r, c);
+    } else {
+        for (int32_t r = 0; r < rows; ++r)
+            for (int32_t c = 0; c < count; ++c)
+                body(r, c);
+    }
+}
+
 template <ElementType Code>
 void GatherColumns(const typename Element<Code>::type *matrix, int64_t matrixPitch, int32_t rows,
                    int32_t count, typename Element<Code>::type *columns, int64_t columnPitch) {
-    for (int32_t r = 0; r < rows; ++r)
-        for (int32_t c = 0; c < count; ++c)
-            columns[c * columnPitch + r] = matrix[r * matrixPitch + c];
+    ForEachInBlock(rows, count, [=](int32_t r, int32_t c) {
+        columns[c * columnPitch + r] = matrix[r * matrixPitch + c];
+    });
 }
 
 template <ElementType Code>
 void ScatterColumns(const typename Element<Code>::type *columns, int64_t columnPitch, int32_t rows,
                     int32_t count, typename Element<Code>::type *matrix, int64_t matrixPitch) {
-    for (int32_t r = 0; r < rows; ++r)
-        for (int32_t c = 0; c < count; ++c)
-            matrix[r * matrixPitch + c] = columns[c * columnPitch + r];
+    ForEachInBlock(rows, count, [=](int32_t r, int32_t c) {
+        matrix[r * matrixPitch + c] = columns[c * columnPitch + r];
+    });
 }
 
 } // namespace qx

@@ -230,7 +230,7 @@ void Dismantle(FFTPlan *plan) {
         Release(stage->raderPlan);
         std::free(stage);
     }
-    std::free(plan->quarterWave);
+    std::free(const_cast<double *>(plan->quarterWave.load(std::memory_order_relaxed)));
     std::free(plan);
 }
 

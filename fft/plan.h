@@ -5,6 +5,7 @@
 #include "qx/fft.h"
 #include "qx/types.h"
 
+#include <atomic>
 #include <cstddef>
 #include <cstdint>
 
@@ -69,7 +70,7 @@ struct FFTPlan {
     FFTPlan *prev, *next; // the cache
 
     // Twiddles of the cosine transforms, built by QuarterWave at its first call; else null.
-    mutable DBL *quarterWave;
+    mutable std::atomic<const double *> quarterWave;
 };
 
 namespace qx {

@@ -12,12 +12,12 @@ namespace {
 
 constexpr double Pi = 3.141592653589793;
 
-DBL *BuildQuarterWave(int32_t length) {
+double *BuildQuarterWave(int32_t length) {
     const int64_t entries = int64_t{length} / 2 + 1;
-    if (entries > std::numeric_limits<std::ptrdiff_t>::max() / int64_t{2 * sizeof(DBL)})
+    if (entries > std::numeric_limits<std::ptrdiff_t>::max() / int64_t{2 * sizeof(double)})
         return nullptr;
     auto *const wave =
-        static_cast<DBL *>(std::malloc(static_cast<std::size_t>(entries) * 2 * sizeof(DBL)));
+        static_cast<double *>(std::malloc(static_cast<std::size_t>(entries) * 2 * sizeof(double)));
     if (!wave)
         return nullptr;
     for (std::ptrdiff_t k = 0; k < entries; ++k) {
@@ -31,13 +31,12 @@ DBL *BuildQuarterWave(int32_t length) {
 } // namespace
 
 const DBL *QuarterWave(const FFTPlan *plan) {
-    const std::atomic_ref<DBL *> shared(plan->quarterWave);
-    DBL *wave = shared.load(std::memory_order_acquire);
+    const double *wave = plan->quarterWave.load(std::memory_order_acquire);
     if (wave)
         return wave;
-    DBL *const built = BuildQuarterWave(plan->length);
+    double *const built = BuildQuarterWave(plan->length);
     // Of several threads that build one at the same time, the first one's stays.
-    if (shared.compare_exchange_strong(wave, built, std::memory_order_acq_rel))
+    if (plan->quarterWave.compare_exchange_strong(wave, built, std::memory_order_acq_rel))
         return built;
     std::free(built);
     return wave;

@@ -33,13 +33,6 @@ int32_t IndexOf(int32_t f, int32_t n, int32_t shift) {
     return f < back ? f + n / 2 : f - back;
 }
 
-// The index of the opposite frequency.
-int32_t OppositeOf(int32_t index, int32_t n, int32_t shift) {
-    if (shift != 0 && n % 2 != 0)
-        return n - 1 - index;
-    return index == 0 ? 0 : n - index;
-}
-
 bool StartsBelowZero(const MatrixRegion &region) {
     return region.rowStart < 0 || region.colStart < 0;
 }
@@ -76,29 +69,65 @@ private:
     HeapBlock<Code> padded_;
 };
 
-// The columns in work, which is row-major with `usedRows` rows of `cols` values, padded with
-// zeros to `rows`, transformed into the columns of out.
-ErrorCode ForwardColumns(const FFTPlan *plan, const CDB *work, int32_t usedRows, int32_t rows,
-                         int32_t cols, int32_t shift, CDB *out, int64_t outPitch) {
-    const int64_t pitch = ColumnPitch(rows);
+// Where a forward transform writes. Its columns come as copies, side by side, whose frequencies
+// ascend from 0.
+class SpectrumMatrix {
+public:
+    SpectrumMatrix(CDB *data, int32_t rows, int32_t cols, int32_t shift)
+        : data_(data), rows_(rows), cols_(cols), zero_(IndexOf(0, rows, shift)),
+          opposites_(shift != 0 && cols % 2 != 0 ? cols - 1 : cols) {}
+
+    void setColumns(int32_t c, int32_t count, const CDB *columns, int64_t pitch) const {
+        const int32_t front = rows_ - zero_;
+        ScatterColumns<ElementType::CDB>(columns, pitch, front, count,
+                                         data_ + c + int64_t{zero_} * cols_, cols_);
+        ScatterColumns<ElementType::CDB>(columns + front, pitch, zero_, count, data_ + c, cols_);
+    }
+
+    // Those of opposite frequency, which hold the conjugates at the opposite rows. Not for the
+    // columns that are opposite to themselves.
+    void setOppositeColumns(int32_t c, int32_t count, const CDB *columns, int64_t pitch) const {
+        if (count < 1)
+            return;
+        CDB *const target = data_ + (opposites_ - c);
+        const int64_t targetPitch = cols_;
+        const int32_t zero = zero_;
+        const int32_t rows = rows_;
+        ForEachInBlock(rows, count, [=](int32_t f, int32_t i) {
+            const CDB &value = columns[i * pitch + f];
+            const int32_t row = f <= zero ? zero - f : zero - f + rows;
+            target[row * targetPitch - i] = CDB{value.re, -value.im};
+        });
+    }
+
+private:
+    CDB *data_;
+    int32_t rows_, cols_;
+    int32_t zero_;      // the row of frequency 0
+    int32_t opposites_; // the sum of the indices of two opposite columns
+};
+
+// Transforms the columns in work, which is row-major with `usedRows` rows, padded with zeros to
+// `rows` values. set(c, count, columns, pitch) takes them as they come.
+template <class Set>
+ErrorCode ForwardColumns(const FFTPlan *plan, const ComplexBlock &work, int32_t usedRows,
+                         int32_t rows, int32_t cols, const Set &set) {
+    const int64_t pitch = PaddedPitch(rows);
     ComplexBlock columns;
     ComplexBlock results;
     if (const ErrorCode failed = columns.allocateCleared(ColumnsAtOnce * pitch))
         return failed;
     if (const ErrorCode failed = results.allocate(ColumnsAtOnce * pitch))
         return failed;
-    const int32_t front = rows - IndexOf(0, rows, shift);
     for (int32_t c = 0; c < cols; c += ColumnsAtOnce) {
         const int32_t count = ColumnsInBlock(c, cols);
-        GatherColumns<ElementType::CDB>(work + c, cols, usedRows, count, columns.data(), pitch);
+        GatherColumns<ElementType::CDB>(work.data() + c, PaddedPitch(cols), usedRows, count,
+                                        columns.data(), pitch);
         for (int32_t i = 0; i < count; ++i)
             if (const ErrorCode failed =
                     Forward(plan, columns.data() + i * pitch, results.data() + i * pitch, rows))
                 return failed;
-        ScatterColumns<ElementType::CDB>(results.data(), pitch, front, count,
-                                         out + c + (rows - front) * outPitch, outPitch);
-        ScatterColumns<ElementType::CDB>(results.data() + front, pitch, rows - front, count,
-                                         out + c, outPitch);
+        set(c, count, results.data(), pitch);
     }
     return 0;
 }
@@ -114,18 +143,6 @@ void KeepHalf(const DBL *h, int32_t n, int32_t shift, CDB *kept) {
         kept[shift == 0 ? half : 0] = CDB{h[half], 0};
 }
 
-// The values right of the first cols/2 + 1 are the conjugates of those of opposite frequency.
-void FillBySymmetry(CDB *out, int32_t rows, int32_t cols, int32_t shift) {
-    for (int32_t r = 0; r < rows; ++r) {
-        CDB *const row = out + int64_t{r} * cols;
-        const CDB *const opposite = out + int64_t{OppositeOf(r, rows, shift)} * cols;
-        for (int32_t c = cols / 2 + 1; c < cols; ++c) {
-            const CDB &value = opposite[OppositeOf(c, cols, shift)];
-            row[c] = CDB{value.re, -value.im};
-        }
-    }
-}
-
 // The inverse transforms of the rows of frequencies 0 to count - 1, in this order, into work.
 ErrorCode InverseRows(const FFTPlan *plan, const CDB *in, int32_t rows, int32_t cols, int32_t shift,
                       int32_t count, CDB *work) {
@@ -139,7 +156,7 @@ ErrorCode InverseRows(const FFTPlan *plan, const CDB *in, int32_t rows, int32_t 
             RotateFromShifted(row, cols, plain.data());
             row = plain.data();
         }
-        if (const ErrorCode failed = Inverse(plan, row, work + int64_t{f} * cols, cols))
+        if (const ErrorCode failed = Inverse(plan, row, work + f * PaddedPitch(cols), cols))
             return failed;
     }
     return 0;
@@ -179,7 +196,7 @@ ErrorCode FFT2DComplexForward(const FFTPlan *rowPlan, const FFTPlan *columnPlan,
     const int32_t used = RowsTaken(region);
     ComplexBlock work;
     ComplexBlock spectrum;
-    if (const ErrorCode failed = work.allocate(int64_t{used} * cols))
+    if (const ErrorCode failed = work.allocate(used * PaddedPitch(cols)))
         return failed;
     if (const ErrorCode failed = spectrum.allocate(cols))
         return failed;
@@ -188,7 +205,7 @@ ErrorCode FFT2DComplexForward(const FFTPlan *rowPlan, const FFTPlan *columnPlan,
         return failed;
     const int32_t back = cols / 2;
     for (int32_t r = 0; r < used; ++r) {
-        CDB *const row = work.data() + int64_t{r} * cols;
+        CDB *const row = work.data() + r * PaddedPitch(cols);
         CDB *const target = shift == 0 ? row : spectrum.data();
         if (const ErrorCode failed = Forward(rowPlan, rows.row(r), target, cols))
             return failed;
@@ -197,7 +214,11 @@ ErrorCode FFT2DComplexForward(const FFTPlan *rowPlan, const FFTPlan *columnPlan,
             CopyElements(target, cols - back, row + back);
         }
     }
-    return ForwardColumns(columnPlan, work.data(), used, region.rows, cols, shift, out, cols);
+    const SpectrumMatrix target(out, region.rows, cols, shift);
+    return ForwardColumns(columnPlan, work, used, region.rows, cols,
+                          [&](int32_t c, int32_t count, const CDB *columns, int64_t pitch) {
+                              target.setColumns(c, count, columns, pitch);
+                          });
 }
 
 ErrorCode FFT2DRealForward(const FFTPlan *rowPlan, const FFTPlan *columnPlan, const DBL *in,
@@ -209,7 +230,7 @@ ErrorCode FFT2DRealForward(const FFTPlan *rowPlan, const FFTPlan *columnPlan, co
     const int32_t used = RowsTaken(region);
     ComplexBlock work;
     HeapBlock<ElementType::DBL> half;
-    if (const ErrorCode failed = work.allocate(int64_t{used} * kept))
+    if (const ErrorCode failed = work.allocate(used * PaddedPitch(kept)))
         return failed;
     if (const ErrorCode failed = half.allocate(cols))
         return failed;
@@ -219,13 +240,20 @@ ErrorCode FFT2DRealForward(const FFTPlan *rowPlan, const FFTPlan *columnPlan, co
     for (int32_t r = 0; r < used; ++r) {
         if (const ErrorCode failed = FFTRealForward(rowPlan, rows.row(r), half.data(), 1, 1, cols))
             return failed;
-        KeepHalf(half.data(), cols, shift, work.data() + int64_t{r} * kept);
+        KeepHalf(half.data(), cols, shift, work.data() + r * PaddedPitch(kept));
     }
-    if (const ErrorCode failed =
-            ForwardColumns(columnPlan, work.data(), used, region.rows, kept, shift, out, cols))
-        return failed;
-    FillBySymmetry(out, region.rows, cols, shift);
-    return 0;
+    // Frequency 0 and, of an even number, n/2 are opposite to themselves.
+    const int32_t first = shift != 0 && cols % 2 != 0 ? 0 : 1;
+    const int32_t last = shift == 0 && cols % 2 != 0 ? kept - 1 : kept - 2;
+    const SpectrumMatrix target(out, region.rows, cols, shift);
+    return ForwardColumns(columnPlan, work, used, region.rows, kept,
+                          [&](int32_t c, int32_t count, const CDB *columns, int64_t pitch) {
+                              target.setColumns(c, count, columns, pitch);
+                              const int32_t from = std::max(c, first);
+                              const int32_t to = std::min(c + count - 1, last);
+                              target.setOppositeColumns(from, to - from + 1,
+                                                        columns + (from - c) * pitch, pitch);
+                          });
 }
 
 // kept: in both inverses a failed column ends the loop unreported, and the columns from there on
@@ -233,11 +261,11 @@ ErrorCode FFT2DRealForward(const FFTPlan *rowPlan, const FFTPlan *columnPlan, co
 
 ErrorCode FFT2DComplexInverse(const FFTPlan *rowPlan, const FFTPlan *columnPlan, const CDB *in,
                               int32_t rows, int32_t cols, int32_t shift, CDB *out) {
-    const int64_t pitch = ColumnPitch(rows);
+    const int64_t pitch = PaddedPitch(rows);
     ComplexBlock work;
     ComplexBlock columns;
     ComplexBlock results;
-    if (const ErrorCode failed = work.allocate(int64_t{rows} * cols))
+    if (const ErrorCode failed = work.allocate(rows * PaddedPitch(cols)))
         return failed;
     if (const ErrorCode failed = columns.allocate(ColumnsAtOnce * pitch))
         return failed;
@@ -248,7 +276,8 @@ ErrorCode FFT2DComplexInverse(const FFTPlan *rowPlan, const FFTPlan *columnPlan,
     int32_t done = ColumnsAtOnce;
     for (int32_t c = 0; c < cols && done == ColumnsAtOnce; c += ColumnsAtOnce) {
         const int32_t count = ColumnsInBlock(c, cols);
-        GatherColumns<ElementType::CDB>(work.data() + c, cols, rows, count, columns.data(), pitch);
+        GatherColumns<ElementType::CDB>(work.data() + c, PaddedPitch(cols), rows, count,
+                                        columns.data(), pitch);
         done = ColumnsDone(count, [&](int32_t i) {
             return Inverse(columnPlan, columns.data() + i * pitch, results.data() + i * pitch,
                            rows);
@@ -260,12 +289,12 @@ ErrorCode FFT2DComplexInverse(const FFTPlan *rowPlan, const FFTPlan *columnPlan,
 
 ErrorCode FFT2DRealInverse(const FFTPlan *rowPlan, const FFTPlan *columnPlan, const CDB *in,
                            int32_t rows, int32_t cols, int32_t shift, DBL *out) {
-    const int64_t pitch = ColumnPitch(rows);
+    const int64_t pitch = PaddedPitch(rows);
     ComplexBlock work;
     HeapBlock<ElementType::DBL> columns;
     HeapBlock<ElementType::DBL> results;
     const int32_t used = rows / 2 + 1;
-    if (const ErrorCode failed = work.allocate(int64_t{used} * cols))
+    if (const ErrorCode failed = work.allocate(used * PaddedPitch(cols)))
         return failed;
     if (const ErrorCode failed = columns.allocate(ColumnsAtOnce * pitch))
         return failed;
@@ -276,7 +305,7 @@ ErrorCode FFT2DRealInverse(const FFTPlan *rowPlan, const FFTPlan *columnPlan, co
     int32_t done = ColumnsAtOnce;
     for (int32_t c = 0; c < cols && done == ColumnsAtOnce; c += ColumnsAtOnce) {
         const int32_t count = ColumnsInBlock(c, cols);
-        GatherHalfComplex(work.data() + c, cols, rows, count, columns.data(), pitch);
+        GatherHalfComplex(work.data() + c, PaddedPitch(cols), rows, count, columns.data(), pitch);
         done = ColumnsDone(count, [&](int32_t i) {
             return FFTRealInverse(columnPlan, columns.data() + i * pitch,
                                   results.data() + i * pitch, 1, 1, rows);

@@ -18,7 +18,7 @@ struct WorkBlock {
 
     ErrorCode take(int64_t columnWork, int64_t rowWork, int32_t rows) {
         const int64_t work = std::max(columnWork, rowWork);
-        const ErrorCode failed = block.allocate(work + ColumnsAtOnce * ColumnPitch(rows));
+        const ErrorCode failed = block.allocate(work + ColumnsAtOnce * PaddedPitch(rows));
         columns = block.data() + (failed ? 0 : work);
         return failed;
     }
@@ -36,7 +36,7 @@ ErrorCode TransformRows(const DBL *in, DBL *out, int32_t rows, int32_t cols, Tra
 template <class Transform>
 ErrorCode TransformColumns(const DBL *in, DBL *out, int32_t rows, int32_t cols, DBL *columns,
                            Transform transform) {
-    const int64_t pitch = ColumnPitch(rows);
+    const int64_t pitch = PaddedPitch(rows);
     for (int32_t c = 0; c < cols; c += ColumnsAtOnce) {
         const int32_t count = ColumnsInBlock(c, cols);
         GatherColumns<ElementType::DBL>(in + c, cols, rows, count, columns, pitch);
