@@ -1,6 +1,7 @@
 #include "spectra/power_spectrum.h"
 
 #include "fft/plan.h"
+#include "frame/lanes.h"
 #include "frame/scratch.h"
 
 #include <cstddef>
@@ -9,6 +10,17 @@ namespace qx {
 namespace {
 
 double SpectrumScale(int32_t n) { return 1.0 / (static_cast<double>(n) * static_cast<double>(n)); }
+
+// The power at frequencies k onward, one for each lane, and at the opposite frequencies.
+template <class L>
+void PowerPairs(const DBL *h, std::ptrdiff_t k, std::ptrdiff_t n, double scale, DBL *x) {
+    const std::ptrdiff_t opposite = n - k - (L::count - 1);
+    const L re = L::load(h + k);
+    const L im = L::load(h + opposite).reversed();
+    const L power = (re * re + im * im) * L(scale);
+    power.store(x + k);
+    power.reversed().store(x + opposite);
+}
 
 } // namespace
 
@@ -30,11 +42,14 @@ ErrorCode PowerSpectrumReal(DBL *x, int32_t n) {
         return failed;
     const double s = SpectrumScale(n);
     x[0] = (h[0] * h[0]) * s;
-    for (std::ptrdiff_t k = 1; k <= (n - 1) / 2; ++k) {
-        const double p = (h[k] * h[k] + h[n - k] * h[n - k]) * s;
-        x[k] = p;
-        x[n - k] = p;
+    const std::ptrdiff_t last = (n - 1) / 2;
+    std::ptrdiff_t k = 1;
+    for (; k + 2 * nativeLanes - 1 <= last; k += 2 * nativeLanes) {
+        PowerPairs<Lanes<nativeLanes>>(h, k, n, s, x);
+        PowerPairs<Lanes<nativeLanes>>(h, k + nativeLanes, n, s, x);
     }
+    for (; k <= last; ++k)
+        PowerPairs<Lanes<1>>(h, k, n, s, x);
     if (n % 2 == 0)
         x[n / 2] = s * (h[n / 2] * h[n / 2]);
     return work.release();

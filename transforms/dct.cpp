@@ -14,6 +14,8 @@ namespace {
 
 ErrorCode ForwardEven(const FFTPlan *plan, const DBL *x, std::ptrdiff_t inStride, DBL *out,
                       std::ptrdiff_t outStride, int32_t n, DBL *work) {
+    const double scale = 2.0 / std::sqrt(2.0 * n);
+    const double root = std::sqrt(static_cast<double>(n));
     DBL *const reordered = work;
     DBL *const h = work + n;
     for (std::ptrdiff_t j = 0; j < n / 2; ++j) {
@@ -26,8 +28,7 @@ ErrorCode ForwardEven(const FFTPlan *plan, const DBL *x, std::ptrdiff_t inStride
     if (!wave)
         return ErrOutOfMemory;
 
-    const double scale = 2.0 / std::sqrt(2.0 * n);
-    out[0] = h[0] / std::sqrt(static_cast<double>(n));
+    out[0] = h[0] / root;
     for (std::ptrdiff_t k = 1; k < n / 2; ++k) {
         const double c = wave[2 * k];
         const double s = wave[2 * k + 1];
