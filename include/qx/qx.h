@@ -3,6 +3,8 @@
 
 /* Every export of the module. */
 
+#include "qx/anova.h"
+#include "qx/distributions.h"
 #include "qx/errors.h"
 #include "qx/fft.h"
 #include "qx/frame.h"

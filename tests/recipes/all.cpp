@@ -7,6 +7,7 @@ const std::vector<Recipe> &AllRecipes() {
         std::vector<Recipe> recipes;
         for (const auto &family : {
                  BasicStatisticsRecipes(),
+                 DistributionRecipes(),
                  FFTRecipes(),
                  SpectraRecipes(),
                  TransformRecipes(),

@@ -6,6 +6,7 @@
 namespace qx::test {
 
 std::vector<Recipe> BasicStatisticsRecipes();
+std::vector<Recipe> DistributionRecipes();
 std::vector<Recipe> FFTRecipes();
 std::vector<Recipe> SpectraRecipes();
 std::vector<Recipe> TransformRecipes();

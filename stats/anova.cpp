@@ -1,0 +1,134 @@
+#include "stats/anova.h"
+
+#include "frame/scratch.h"
+#include "stats/distributions.h"
+
+#include <cstddef>
+
+namespace qx {
+
+namespace {
+
+struct Level {
+    DBL sum;
+    I32 label;
+    I32 count;
+};
+
+// The levels in the order of their first appearance.
+struct Levels {
+    Level *table;
+    int32_t limit;
+    int32_t count;
+
+    // The level of a label, opened if it is new; null beyond the limit. Neighbours often share a
+    // label, so the search starts with the last one found.
+    Level *find(int32_t label) {
+        if (last < count && table[last].label == label)
+            return &table[last];
+        for (last = 0; last < count; ++last)
+            if (table[last].label == label)
+                return &table[last];
+        if (count == limit)
+            return nullptr;
+        table[count] = {0.0, label, 0};
+        return &table[count++];
+    }
+    int32_t last = 0;
+};
+
+// Upper tail of a distribution's status and value.
+template <class Distribution>
+ErrorCode UpperTail(Distribution distribution, double *p) {
+    double below;
+    const ErrorCode status = distribution(&below);
+    if (status == 0)
+        *p = 1.0 - below;
+    return status;
+}
+
+} // namespace
+
+ErrorCode ContingencyTest(const I32 *table, int32_t rows, int32_t cols, DBL *chiSquare, DBL *p) {
+    if (rows < 0 || cols < 0)
+        return ErrTableNegativeSize;
+    if (rows < 2 || cols < 2)
+        return ErrTableTooSmall;
+    Scratch<ElementType::DBL> sums;
+    if (const ErrorCode status = sums.allocate(int64_t{rows} + cols))
+        return status;
+    DBL *rowSum = sums.data();
+    DBL *colSum = sums.data() + rows;
+    Fill(rowSum, std::ptrdiff_t{rows} + cols, 0.0);
+    double total = 0.0;
+    for (int32_t i = 0; i < rows; ++i)
+        for (int32_t j = 0; j < cols; ++j) {
+            const int32_t cell = table[std::ptrdiff_t{i} * cols + j];
+            if (cell < 0)
+                return ErrTableNegativeSize;
+            rowSum[i] += cell;
+            colSum[j] += cell;
+            total += cell;
+        }
+
+    double statistic = 0.0;
+    for (int32_t i = 0; i < rows; ++i)
+        for (int32_t j = 0; j < cols; ++j) {
+            const double expected = colSum[j] * rowSum[i] / total;
+            const double difference = table[std::ptrdiff_t{i} * cols + j] - expected;
+            statistic += difference * difference / expected;
+        }
+    *chiSquare = statistic;
+    // A table of 2^31 degrees of freedom cannot be held.
+    const int32_t dof = static_cast<int32_t>(int64_t{rows - 1} * (cols - 1));
+    double upper = 0.0;
+    ErrorCode status =
+        UpperTail([&](double *below) { return ChiSquareCDF(statistic, dof, below); }, &upper);
+    if (status == 0)
+        *p = upper;
+    return Merge(status, sums.release());
+}
+
+ErrorCode OneWayAnova(const DBL *y, const I32 *labels, int32_t n, int32_t k, double alpha,
+                      OneWayTable *result) {
+    if (k < 2 || k >= n)
+        return ErrAnovaFewLevels;
+    if (alpha < 0.0 || alpha > 1.0)
+        return ErrBadSignificance;
+    ScratchBytes block;
+    if (const ErrorCode status = block.allocate(k * int64_t{sizeof(Level)}))
+        return status;
+    Levels levels = {static_cast<Level *>(block.bytes()), k, 0};
+
+    double total = 0.0;
+    double squares = 0.0;
+    for (int32_t i = 0; i < n; ++i) {
+        Level *level = levels.find(labels[i]);
+        if (level == nullptr)
+            return ErrAnovaFactorEmpty;
+        level->sum += y[i];
+        ++level->count;
+        total += y[i];
+        squares += y[i] * y[i];
+    }
+    if (levels.count < k)
+        return ErrAnovaNoReplication;
+
+    const double correction = total * total / n;
+    double between = 0.0;
+    for (int32_t i = 0; i < k; ++i)
+        between += levels.table[i].sum * levels.table[i].sum / levels.table[i].count;
+    result->ssTotal = squares - correction;
+    result->ssBetween = between - correction;
+    result->ssError = result->ssTotal - result->ssBetween;
+    result->msBetween = result->ssBetween / (k - 1);
+    result->msError = result->ssError / (n - k);
+    result->f = result->msBetween / result->msError;
+    ErrorCode status = UpperTail(
+        [&](double *below) { return FisherCDF(result->f, k - 1, n - k, below); }, &result->p);
+    if (status == 0)
+        status = FisherQuantile(1.0 - alpha, k - 1, n - k, &result->fCritical);
+    return Merge(status, block.release());
+}
+
+} // namespace qx

@@ -1,0 +1,42 @@
+#ifndef QX_STATS_GAMMA_H
+#define QX_STATS_GAMMA_H
+
+namespace qx {
+
+// The gamma family. A fault of the domain gives NaN; there is no status.
+//
+// The rational approximations, with their intervals, are those of W. J. Cody and K. E. Hillstrom
+// (Chebyshev approximations for the natural logarithm of the gamma function, 1967) and of
+// Stirling's series; the continued fractions those of M. Abramowitz and I. A. Stegun (Handbook of
+// mathematical functions, 1964), 6.5.31, 26.5.8 and 26.5.9.
+
+// Horner's rule: coef[0] x^degree + ... + coef[degree].
+double PolyEval(double x, const double *coef, int degree);
+// The same with coef[0] taken as 1 and not read.
+double PolyEvalMonic(double x, const double *coef, int degree);
+
+// Gamma(x). Beyond |x| = 33 by Stirling's formula and reflection, else by a rational function on
+// [2, 3] and the recurrence. NaN at 0 and at negative integers beyond -33.
+double GammaFunction(double x);
+
+// ln Gamma(x), x >= 0. From 33 on the asymptotic series, below it a rational function on [2, 3]
+// and the recurrence. NaN for x < 0.
+double LnGammaFunction(double x);
+
+// Gamma(x) by Stirling's formula, meant for x above 33; +infinity from 709.78 on, where the
+// formula's exponential would overflow.
+double StirlingGamma(double x);
+
+// The regularised lower and upper incomplete gamma functions P(a, x) and Q(a, x): the series up
+// to max(1, a), the continued fraction beyond. Both loops run until they have converged; near
+// x = a that takes about 6 sqrt(a) terms, which is long where a exceeds 1e9.
+double IncompleteGammaP(double a, double x);
+double IncompleteGammaQ(double a, double x);
+
+// The regularised incomplete beta function I_x(a, b), by the two continued fractions, which are
+// cut after 100 terms: with a and b in the thousands and x near a / (a + b) digits are lost.
+double IncompleteBeta(double a, double b, double x);
+
+} // namespace qx
+
+#endif
