@@ -71,7 +71,10 @@ ErrorCode RunRealTwiddle(const FFTPlan &plan, int32_t level, DBL *data, ptrdiff_
     if (plan.kinds[level] != KernelFactor)
         return PrimeRealTwiddle(PrimeAt(plan, level), data, stride, m);
     const FFTStage &stage = *plan.stages[level];
-    stage.kernels->realLanesTwiddle(data, stage.realLanes, stride, m);
+    if (stride == 1)
+        stage.kernels->realLanesTwiddle(data, stage, m);
+    else
+        plan.realTwiddle[level](data, stage.twiddleCos, stage.twiddleSin, stride, m);
     return 0;
 }
 
@@ -111,7 +114,7 @@ struct ComplexLanesPath {
         if (plan.kinds[level] != KernelFactor)
             return PrimeComplexTwiddle(PrimeAt(plan, level), out, out + 1, 2, m);
         const FFTStage &stage = *plan.stages[level];
-        stage.kernels->complexLanesTwiddle(out, stage.complexLanes, m);
+        stage.kernels->complexLanesTwiddle(out, stage, m);
         return 0;
     }
 };

@@ -10,37 +10,54 @@ namespace qx {
 
 using std::ptrdiff_t;
 
-template <class V>
-QX_INLINE Complex<V> Twiddled(Complex<V> x, V c, V s) {
-    return {x.re * c - x.im * s, x.re * s + x.im * c};
-}
+// Columns of packed complex values that stand in one Wide.
+inline constexpr int packedColumns = nativeLanes / 2;
 
 // ---- One column, any strides ----
 
-struct ComplexColumnIn {
+struct ColumnIn {
     const DBL *re, *im;
     ptrdiff_t leg;
-    QX_INLINE Complex<Narrow> at(int j) const { return {Narrow(re[j * leg]), Narrow(im[j * leg])}; }
+    QX_INLINE One at(int j) const { return One(One::Vector{re[j * leg], im[j * leg]}); }
 };
 
-struct ComplexColumnOut {
+struct ColumnOut {
     DBL *re, *im;
     ptrdiff_t leg;
-    QX_INLINE void set(int k, Narrow a, Narrow b) const {
-        re[k * leg] = a.v;
-        im[k * leg] = b.v;
+    QX_INLINE void set(int k, One x) const {
+        re[k * leg] = x[0];
+        im[k * leg] = x[1];
     }
 };
 
 // With the twiddles of the column, those of j = 1 first.
 struct TwiddledColumnIn {
-    ComplexColumnIn column;
+    ColumnIn column;
     const DBL *twiddleCos, *twiddleSin;
-    QX_INLINE Complex<Narrow> at(int j) const {
+    QX_INLINE One at(int j) const {
         if (j == 0)
             return column.at(0);
-        return Twiddled(column.at(j), Narrow(twiddleCos[j - 1]), Narrow(twiddleSin[j - 1]));
+        return Twiddled(column.at(j), One(One::Vector{twiddleCos[j - 1], twiddleSin[j - 1]}));
     }
+};
+
+// Results of a half-complex column: real parts upward from `up`, imaginary parts downward from the
+// last block behind `down`; past the middle of the spectrum they change places.
+template <int P>
+struct HalfComplexColumnOut {
+    DBL *up, *down;
+    ptrdiff_t leg;
+    QX_INLINE void set(int q, double re, double im) const {
+        if (q < (P + 1) / 2) {
+            up[q * leg] = re;
+            down[(P - 1 - q) * leg] = im;
+        } else {
+            down[(P - 1 - q) * leg] = re;
+            up[q * leg] = -im;
+        }
+    }
+    QX_INLINE void set(int q, Narrow re, Narrow im) const { set(q, re.v, im.v); }
+    QX_INLINE void set(int q, One x) const { set(q, x[0], x[1]); }
 };
 
 struct RealColumnIn {
@@ -59,73 +76,64 @@ struct RealColumnOut {
     }
 };
 
-// Results of a half-complex column of p m values: real parts upward from `up`, imaginary parts
-// downward from the last block; past the middle of the spectrum they change places.
-template <int P>
-struct HalfComplexColumnOut {
-    DBL *up, *down;
-    ptrdiff_t leg;
-    QX_INLINE void set(int q, Narrow re, Narrow im) const {
-        const bool direct = q < (P + 1) / 2;
-        (direct ? up + q * leg : down + (P - 1 - q) * leg)[0] = re.v;
-        (direct ? down + (P - 1 - q) * leg : up + q * leg)[0] = direct ? im.v : -im.v;
-    }
-    QX_INLINE void setReal(int q, Narrow re) const { up[q * leg] = re.v; }
-};
-
-// ---- Complex columns in lanes, interleaved; lanes in the order of laneColumn ----
-
-struct ComplexLanesIn { // neighbouring columns
+// The values of the middle column with alternating signs. For odd p its transform at the half-odd
+// frequency q + 1/2 is that of these values at the whole frequency q + (p + 1) / 2.
+struct AlternatingColumnIn {
     const DBL *x;
     ptrdiff_t leg;
-    QX_INLINE Complex<Wide> at(int j) const {
-        const DBL *const from = x + j * leg;
-        const Wide a = Wide::load(from);
-        const Wide b = Wide::load(from + nativeLanes);
-        return {PairsLow(a, b), PairsHigh(a, b)};
+    QX_INLINE Narrow at(int j) const { return Narrow(j % 2 == 0 ? x[j * leg] : -x[j * leg]); }
+};
+template <int P>
+struct MiddleColumnOut {
+    DBL *middle;
+    ptrdiff_t leg;
+    // Result k of the half-complex spectrum is the real part of frequency k or the imaginary one of
+    // p - k. Frequency k is the conjugate of q = (p - 1) / 2 - k.
+    QX_INLINE void set(int k, Narrow a) const {
+        if (2 * k < P)
+            middle[((P - 1) / 2 - k) * leg] = a.v;
+        else
+            middle[((P - 1) / 2 + P - k) * leg] = -a.v;
+    }
+    QX_INLINE void setPair(int k, Narrow a, Narrow b) const {
+        set(k, a);
+        set(k + 1, b);
     }
 };
 
-struct ComplexLanesOut {
+// ---- Packed columns in lanes ----
+
+struct PackedIn { // neighbouring columns
+    const DBL *x;
+    ptrdiff_t leg;
+    QX_INLINE Wide at(int j) const { return Wide::load(x + j * leg); }
+};
+
+struct PackedOut {
     DBL *y;
     ptrdiff_t leg;
-    QX_INLINE void set(int k, Wide re, Wide im) const {
-        DBL *const to = y + k * leg;
-        PairsLow(re, im).store(to);
-        PairsHigh(re, im).store(to + nativeLanes);
-    }
+    QX_INLINE void set(int k, Wide x) const { x.store(y + k * leg); }
 };
 
-struct ComplexGatherIn { // columns anywhere
-    const DBL *x[nativeLanes];
-    ptrdiff_t leg;
-    QX_INLINE Complex<Wide> at(int j) const {
-        const Wide a = LoadPairs(x, j * leg);
-        const Wide b = LoadPairs(x + nativeLanes / 2, j * leg);
-        return {PairsLow(a, b), PairsHigh(a, b)};
-    }
-};
-
-struct ComplexScatterOut {
-    DBL *y[nativeLanes];
-    ptrdiff_t leg;
-    QX_INLINE void set(int k, Wide re, Wide im) const {
-        StorePairs(PairsLow(re, im), y, k * leg);
-        StorePairs(PairsHigh(re, im), y + nativeLanes / 2, k * leg);
-    }
-};
-
-// Any of the complex inputs, with twiddles from a block of a lane table.
-template <class Columns>
-struct TwiddledLanesIn {
-    Columns columns;
+struct PackedTwiddledIn { // with a block of the lane table
+    PackedIn columns;
     const DBL *lanes;
-    QX_INLINE Complex<Wide> at(int j) const {
+    QX_INLINE Wide at(int j) const {
         if (j == 0)
             return columns.at(0);
-        const DBL *const twiddle = lanes + (j - 1) * 2 * nativeLanes;
-        return Twiddled(columns.at(j), Wide::load(twiddle), Wide::load(twiddle + nativeLanes));
+        return Twiddled(columns.at(j), Wide::load(lanes + (j - 1) * nativeLanes));
     }
+};
+
+struct PackedGatherIn { // columns anywhere
+    const DBL *x[packedColumns];
+    ptrdiff_t leg;
+    QX_INLINE Wide at(int j) const { return LoadPairs(x, j * leg); }
+};
+
+struct PackedBlocksOut { // transform by transform
+    DBL *y[packedColumns];
+    QX_INLINE void set(int k, Wide x) const { StorePairs(x, y, 2 * k); }
 };
 
 // ---- Real columns in lanes ----
@@ -136,31 +144,25 @@ struct RealLanesIn { // neighbouring columns
     QX_INLINE Wide at(int j) const { return Wide::load(x + j * leg); }
 };
 
-QX_INLINE Wide GatherLanes(const DBL *const *x, ptrdiff_t at) {
-#ifdef __AVX__
-    return Wide(Wide::Vector{x[0][at], x[1][at], x[2][at], x[3][at]});
-#else
-    return Wide(Wide::Vector{x[0][at], x[1][at]});
-#endif
-}
-QX_INLINE void ScatterLanes(Wide values, DBL *const *y, ptrdiff_t at) {
-    for (int lane = 0; lane < nativeLanes; ++lane)
-        y[lane][at] = values[lane];
-}
-
 struct RealGatherIn { // columns anywhere
     const DBL *x[nativeLanes];
     ptrdiff_t leg;
-    QX_INLINE Wide at(int j) const { return GatherLanes(x, j * leg); }
+    QX_INLINE Wide at(int j) const {
+#ifdef __AVX__
+        return Wide(Wide::Vector{x[0][j * leg], x[1][j * leg], x[2][j * leg], x[3][j * leg]});
+#else
+        return Wide(Wide::Vector{x[0][j * leg], x[1][j * leg]});
+#endif
+    }
 };
 
-// Transform by transform, each one's results side by side.
-struct RealBlocksOut {
+struct RealBlocksOut { // transform by transform
     DBL *h[nativeLanes];
-    QX_INLINE void set(int k, Wide a) const { ScatterLanes(a, h, k); }
+    QX_INLINE void set(int k, Wide a) const {
+        for (int lane = 0; lane < nativeLanes; ++lane)
+            h[lane][k] = a[lane];
+    }
     QX_INLINE void setPair(int k, Wide a, Wide b) const {
-        const Wide low = PairsLow(a, b);
-        const Wide high = PairsHigh(a, b);
 #ifdef __AVX__
         DBL *const even[] = {h[0], h[2]};
         DBL *const odd[] = {h[1], h[3]};
@@ -168,18 +170,29 @@ struct RealBlocksOut {
         DBL *const even[] = {h[0]};
         DBL *const odd[] = {h[1]};
 #endif
-        StorePairs(low, even, k);
-        StorePairs(high, odd, k);
+        StorePairs(PairsLow(a, b), even, k);
+        StorePairs(PairsHigh(a, b), odd, k);
     }
 };
 
-// Columns k upward and, mirrored, m - k downward of the half-complex blocks, in place: the real
-// parts of Y_j stand at up + j leg, its imaginary parts at down + j leg.
-struct PairLanesIn { // `down` is the lowest of its columns
+// ---- Pairs of mirrored columns of half-complex blocks ----
+//
+// Columns k upward and m - k downward, in place: the real parts of Y_j stand at up + j leg, its
+// imaginary parts at down + j leg. `down` is the lowest of its columns.
+
+struct PairLanesIn {
     const DBL *up, *down;
     ptrdiff_t leg;
+    const DBL *lanes; // a block of the lane table
     QX_INLINE Complex<Wide> at(int j) const {
-        return {Wide::load(up + j * leg), Wide::load(down + j * leg).reversed()};
+        const Wide re = Wide::load(up + j * leg);
+        const Wide im = Wide::load(down + j * leg).reversed();
+        if (j == 0)
+            return {re, im};
+        const DBL *const twiddle = lanes + (j - 1) * 2 * nativeLanes;
+        const Wide c = Wide::load(twiddle);
+        const Wide s = Wide::load(twiddle + nativeLanes);
+        return {re * c - im * s, im * c + re * s};
     }
 };
 
@@ -197,25 +210,6 @@ struct PairLanesOut {
             re.reversed().store(downward);
             (-im).store(upward);
         }
-    }
-};
-
-struct PairGatherIn { // any stride, any columns
-    const DBL *up[nativeLanes], *down[nativeLanes];
-    ptrdiff_t leg;
-    QX_INLINE Complex<Wide> at(int j) const {
-        return {GatherLanes(up, j * leg), GatherLanes(down, j * leg)};
-    }
-};
-
-template <int P>
-struct PairScatterOut {
-    DBL *up[nativeLanes], *down[nativeLanes];
-    ptrdiff_t leg;
-    QX_INLINE void set(int q, Wide re, Wide im) const {
-        const bool direct = q < (P + 1) / 2;
-        ScatterLanes(re, direct ? up : down, (direct ? q : P - 1 - q) * leg);
-        ScatterLanes(direct ? im : -im, direct ? down : up, (direct ? P - 1 - q : q) * leg);
     }
 };
 

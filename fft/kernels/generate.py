@@ -3,12 +3,17 @@
 
     generate.py FOLDER
 
-Each file holds three texts over a lane type V, one for each kind of data:
+Each file holds four texts over a lane type V:
 
-    ComplexTransform<p>   p complex values to p complex values
+    PackedTransform<p>    p complex values to p complex values, real and imaginary part side by side
+                          in one V
+    SplitTransform<p>     the same, each part in a V of its own
     RealTransform<p>      p real values to their half-complex spectrum
-    OddTransform<p>       p real values to the complex values at the half-odd frequencies,
-                          X[q] = sum over j of x[j] exp(-2 pi i j (q + 1/2) / p), 2q + 1 <= p
+    OddTransform<p>       for even p: p real values to the complex values at the half-odd
+                          frequencies, X[q] = sum over j of x[j] exp(-2 pi i j (q + 1/2) / p),
+                          2q + 1 < p
+
+All do the same arithmetic on the parts of each value, so packed and split data give the same bits.
 
 The algebra works on expressions: a transform is a Python function from input expressions to
 output expressions. Expressions are shared (equal ones are one node), signs move outward into
@@ -114,45 +119,18 @@ class Expressions:
         sign, x = a
         if constant < 0:
             constant, sign = -constant, -sign
-        if constant == 1:
-            return (sign, x)
-        operation, *operands = self.nodes[x]
-        if operation == "*":
-            return (sign, self.node("*", operands[0] * constant, operands[1]))
-        return (sign, self.node("*", constant, x))
+        return (sign, x if constant == 1 else self.node("*", constant, x))
 
 
 def negate(a):
     return a and (-a[0], a[1])
 
 
-class Algebra:
-    """Complex values are pairs (real, imaginary) of values."""
+class Transforms:
+    """The transforms of a list of complex values, over the operations of a subclass."""
 
     def __init__(self):
         self.e = Expressions()
-
-    def add(self, a, b):
-        return (self.e.add(a[0], b[0]), self.e.add(a[1], b[1]))
-
-    def subtract(self, a, b):
-        return self.add(a, (negate(b[0]), negate(b[1])))
-
-    def scale(self, constant, a):
-        return (self.e.multiply(constant, a[0]), self.e.multiply(constant, a[1]))
-
-    def turn(self, a, numerator, denominator):
-        """a exp(-2 pi i numerator / denominator)"""
-        c, s = cos_turn(numerator, denominator), sin_turn(numerator, denominator)
-        re, im = a
-        if abs(c) == abs(s):    # an eighth of a turn: the sums come first
-            sign_c, sign_s = (1 if c > 0 else -1), (1 if s > 0 else -1)
-            root = abs(c)
-            first = self.e.add(re if sign_c > 0 else negate(re), im if sign_s > 0 else negate(im))
-            second = self.e.add(im if sign_c > 0 else negate(im), negate(re) if sign_s > 0 else re)
-            return (self.e.multiply(root, first), self.e.multiply(root, second))
-        return (self.e.add(self.e.multiply(c, re), self.e.multiply(s, im)),
-                self.e.add(self.e.multiply(c, im), negate(self.e.multiply(s, re))))
 
     # -- Transforms: a list of complex values to the list of its spectrum.
 
@@ -179,7 +157,7 @@ class Algebra:
         for first in range(1, half + 1, 2):
             group = range(first, min(first + 2, half + 1))
             even = {k: x[0] for k in group}
-            odd = {k: (0, 0) for k in group}
+            odd = {k: self.zero for k in group}
             for j in range(1, half + 1):
                 for k in group:
                     even[k] = self.add(even[k], self.scale(cos_turn(j * k, n), sums[j]))
@@ -190,7 +168,7 @@ class Algebra:
 
     def mirrored(self, spectrum, k, even, odd):
         """X[k] = even - i odd and X[n-k] = even + i odd"""
-        turned = (odd[1], negate(odd[0]))
+        turned = self.minus_i(odd)
         spectrum[k] = self.add(even, turned)
         spectrum[-k] = self.subtract(even, turned)
 
@@ -220,7 +198,7 @@ class Algebra:
     def composite(self, x, r):
         n = len(x)
         m = n // r
-        is_real = all(value[1] == 0 for value in x)
+        is_real = all(self.is_real(value) for value in x)
         columns = [self.transform(x[j::r]) for j in range(r)]
         spectrum = [None] * n
         for k in range(m // 2 + 1 if is_real else m):
@@ -228,17 +206,17 @@ class Algebra:
             for q, value in enumerate(self.transform(turned)):
                 spectrum[k + q * m] = value
                 if is_real:
-                    spectrum[-(k + q * m)] = (value[0], negate(value[1]))
+                    spectrum[-(k + q * m)] = self.conjugate(value)
         return spectrum
 
     def odd_frequencies(self, x):
-        """The spectrum of real values at the half-odd frequencies q + 1/2."""
+        """The spectrum of n real values at the half-odd frequencies q + 1/2."""
         n = len(x)
         if n == 1:
             return list(x)
         if n % 2:
             # exp(-pi i j) turns frequency q + 1/2 into the whole frequency q + (n + 1)/2.
-            signed = [x[j] if j % 2 == 0 else (negate(x[j][0]), 0) for j in range(n)]
+            signed = [x[j] if j % 2 == 0 else self.scale(-1, x[j]) for j in range(n)]
             spectrum = self.transform(signed)
             return [spectrum[(q + (n + 1) // 2) % n] for q in range(n)]
         r = SPLIT.get(n, 2)
@@ -249,116 +227,186 @@ class Algebra:
             turned = [self.turn(columns[j][k], j * (2 * k + 1), 2 * n) for j in range(r)]
             for q, value in enumerate(self.transform(turned)):
                 spectrum[k + q * m] = value
-                spectrum[n - 1 - (k + q * m)] = (value[0], negate(value[1]))
+                spectrum[n - 1 - (k + q * m)] = self.conjugate(value)
         return spectrum
+
+
+class Split(Transforms):
+    """Complex values are pairs (real, imaginary) of values; what is 0 costs nothing."""
+
+    zero = (0, 0)
+
+    def add(self, a, b):
+        return (self.e.add(a[0], b[0]), self.e.add(a[1], b[1]))
+
+    def subtract(self, a, b):
+        return self.add(a, (negate(b[0]), negate(b[1])))
+
+    def scale(self, constant, a):
+        return (self.e.multiply(constant, a[0]), self.e.multiply(constant, a[1]))
+
+    def minus_i(self, a):
+        return (a[1], negate(a[0]))
+
+    def conjugate(self, a):
+        return (a[0], negate(a[1]))
+
+    def is_real(self, a):
+        return a[1] == 0
+
+    def turn(self, a, numerator, denominator):
+        """a exp(-2 pi i numerator / denominator)"""
+        c, s = cos_turn(numerator, denominator), sin_turn(numerator, denominator)
+        if abs(c) == abs(s):    # an eighth of a turn: the sums come first
+            turned = self.scale(s / abs(s), self.minus_i(a))
+            return self.scale(abs(c), self.add(self.scale(c / abs(c), a), turned))
+        re, im = a
+        return (self.e.add(self.e.multiply(c, re), self.e.multiply(s, im)),
+                self.e.add(self.e.multiply(c, im), negate(self.e.multiply(s, re))))
+
+
+class Packed(Transforms):
+    """Complex values are values; "i" is the product with i, "turn" the one with c - i s."""
+
+    zero = 0
+
+    def add(self, a, b):
+        return self.e.add(a, b)
+
+    def subtract(self, a, b):
+        return self.e.add(a, negate(b))
+
+    def scale(self, constant, a):
+        return self.e.multiply(constant, a)
+
+    def minus_i(self, a):
+        return a and (-a[0], self.e.node("i", a[1]))
+
+    def is_real(self, a):
+        return False
+
+    def turn(self, a, numerator, denominator):
+        c, s = cos_turn(numerator, denominator), sin_turn(numerator, denominator)
+        if s == 0:
+            return self.scale(c, a)
+        if c == 0:
+            return self.scale(s, self.minus_i(a))
+        if abs(c) == abs(s):
+            turned = self.scale(s / abs(s), self.minus_i(a))
+            return self.scale(abs(c), self.add(self.scale(c / abs(c), a), turned))
+        return (a[0], self.e.node("turn", c, s, a[1]))
 
 
 # ---- Texts ---------------------------------------------------------------------------------
 
-class Text:
-    """The statements that outputs need, in the order in which the algebra made them."""
-
-    def __init__(self, algebra, outputs):
-        self.nodes = algebra.e.nodes
-        self.outputs = outputs      # list of (store format, values)
-        self.lines = []
-        self.loaded = set()
-
-    def operand(self, value):
-        if value == 0:
-            return "V(0.0)"
-        sign, node = value
-        return ("-" if sign < 0 else "") + f"t{node}"
-
-    def needed(self):
-        pending = [v[1] for _, values in self.outputs for v in values if v != 0]
-        needed = set()
-        while pending:
-            node = pending.pop()
-            if node not in needed:
-                needed.add(node)
-                operation, *operands = self.nodes[node]
-                if operation in "+-":
-                    pending += operands
-                elif operation == "*":
-                    pending.append(operands[1])
-        return needed
-
-    def write(self):
-        stores = {}
-        for form, values in self.outputs:
-            last = max(v[1] for v in values if v != 0)
-            stores.setdefault(last, []).append(form.format(*map(self.operand, values)))
-        operations = 0
-        for node in sorted(self.needed()):
-            operation, *operands = self.nodes[node]
-            if operation == "input":
-                self.load(*operands)
-            if operation in ("+", "-"):
-                self.lines.append(f"const V t{node} = t{operands[0]} {operation} t{operands[1]};")
-                operations += 1
-            elif operation == "*":
-                constant = float(operands[0])
-                self.lines.append(f"const V t{node} = V({constant!r}) * t{operands[1]};")
-                operations += 1
-            elif isinstance(operands[0], tuple):
-                self.lines.append(f"const V t{node} = x{operands[0][1]}.{operands[0][0]};")
-            self.lines += stores.get(node, [])
-        return operations
-
-    def load(self, name):
-        if isinstance(name, tuple):
-            if name[1] not in self.loaded:
-                self.loaded.add(name[1])
-                self.lines.append(f"const Complex<V> x{name[1]} = in.at({name[1]});")
-        else:
-            node = self.nodes.index(("input", name))
-            self.lines.append(f"const V t{node} = in.at({name});")
+def operand(value):
+    if value == 0:
+        return "V(0.0)"
+    return ("-" if value[0] < 0 else "") + f"t{value[1]}"
 
 
-def complex_text(p):
-    algebra = Algebra()
-    x = [(algebra.e.input(("re", j)), algebra.e.input(("im", j))) for j in range(p)]
-    spectrum = algebra.transform(x)
-    return Text(algebra, [(f"out.set({k}, {{}}, {{}});", spectrum[k]) for k in range(p)])
+def needed_nodes(nodes, outputs):
+    pending = [value[1] for _, values in outputs for value in values if value != 0]
+    needed = set()
+    while pending:
+        node = pending.pop()
+        if node not in needed:
+            needed.add(node)
+            if nodes[node][0] != "input":
+                pending += [x for x in nodes[node][1:] if isinstance(x, int)]
+    return sorted(needed)
 
 
-def real_text(p):
-    algebra = Algebra()
-    spectrum = algebra.transform([(algebra.e.input(j), 0) for j in range(p)])
-    half = [spectrum[k][0] if 2 * k <= p else spectrum[p - k][1] for k in range(p)]
-    outputs = [(f"out.setPair({k}, {{}}, {{}});", half[k:k + 2]) for k in range(0, p - 1, 2)]
-    if p % 2:
-        outputs.append((f"out.set({p - 1}, {{}});", half[p - 1:]))
-    return Text(algebra, outputs)
+EXPRESSIONS = {
+    "+": "t{} + t{}",
+    "-": "t{} - t{}",
+    "*": "V({!r}) * t{}",
+    "i": "TimesI(t{})",
+    "turn": "Turned(t{2}, {0!r}, {1!r})",
+}
 
 
-def odd_text(p):
-    algebra = Algebra()
-    spectrum = algebra.odd_frequencies([(algebra.e.input(j), 0) for j in range(p)])
-    outputs = []
-    for q in range((p + 1) // 2):
-        form = "out.setReal({}, {{}});" if 2 * q + 1 == p else "out.set({}, {{}}, {{}});"
-        values = spectrum[q][:1] if 2 * q + 1 == p else spectrum[q]
-        outputs.append((form.format(q), values))
-    return Text(algebra, outputs)
+def text_of(name, p, transforms, outputs):
+    """The statements that the outputs (store format, values) need, in the order in which the
+    algebra made them; a store stands behind the last of its values."""
+    nodes = transforms.e.nodes
+    stores = {}
+    for form, values in outputs:
+        last = max(value[1] for value in values if value != 0)
+        stores.setdefault(last, []).append(form.format(*map(operand, values)))
+    lines, loaded, loaded_pairs = [], set(), set()
 
+    def load(node):
+        """An input is loaded where it is first used."""
+        name = nodes[node][1]
+        if node in loaded:
+            return
+        loaded.add(node)
+        if isinstance(name, int):
+            lines.append(f"const V t{node} = in.at({name});")
+            return
+        part, j = name
+        if j not in loaded_pairs:
+            loaded_pairs.add(j)
+            lines.append(f"const Complex<V> x{j} = in.at({j});")
+        lines.append(f"const V t{node} = x{j}.{part};")
 
-def struct_of(kind, p, text):
-    operations = text.write()
-    body = "\n".join("        " + line for line in text.lines)
-    return (f"template <>\nstruct {kind}<{p}> {{ // {operations} operations\n"
+    for node in needed_nodes(nodes, outputs):
+        operation, *operands = nodes[node]
+        if operation != "input":
+            for x in operands:
+                if isinstance(x, int) and nodes[x][0] == "input":
+                    load(x)
+            operands = [float(x) if isinstance(x, Decimal) else x for x in operands]
+            lines.append(f"const V t{node} = {EXPRESSIONS[operation].format(*operands)};")
+        elif node in stores:    # radix 2 passes values through
+            for x in range(node + 1):
+                load(x)
+        lines += stores.get(node, [])
+    body = "\n".join("        " + line for line in lines)
+    return (f"template <>\nstruct {name}<{p}> {{\n"
             f"    template <class V, class In, class Out>\n"
             f"    static QX_INLINE void run(const In &in, const Out &out) {{\n{body}\n    }}\n}};\n")
 
 
+def packed_text(p):
+    packed = Packed()
+    spectrum = packed.transform([packed.e.input(j) for j in range(p)])
+    outputs = [(f"out.set({k}, {{}});", [spectrum[k]]) for k in range(p)]
+    return text_of("PackedTransform", p, packed, outputs)
+
+
+def split_text(p):
+    split = Split()
+    x = [(split.e.input(("re", j)), split.e.input(("im", j))) for j in range(p)]
+    spectrum = split.transform(x)
+    outputs = [(f"out.set({k}, {{}}, {{}});", spectrum[k]) for k in range(p)]
+    return text_of("SplitTransform", p, split, outputs)
+
+
+def real_text(p):
+    split = Split()
+    spectrum = split.transform([(split.e.input(j), 0) for j in range(p)])
+    half = [spectrum[k][0] if 2 * k <= p else spectrum[p - k][1] for k in range(p)]
+    outputs = [(f"out.setPair({k}, {{}}, {{}});", half[k:k + 2]) for k in range(0, p - 1, 2)]
+    if p % 2:
+        outputs.append((f"out.set({p - 1}, {{}});", half[p - 1:]))
+    return text_of("RealTransform", p, split, outputs)
+
+
+def odd_text(p):
+    split = Split()
+    spectrum = split.odd_frequencies([(split.e.input(j), 0) for j in range(p)])
+    outputs = [(f"out.set({q}, {{}}, {{}});", spectrum[q]) for q in range(p // 2)]
+    return text_of("OddTransform", p, split, outputs)
+
+
 def file_of(p):
+    texts = [packed_text(p), split_text(p), real_text(p)] + ([odd_text(p)] if p % 2 == 0 else [])
     return "\n".join([
         f"// The kernels of radix {p}, made by fft/kernels/generate.py.\n",
         "#include \"fft/kernels/kernel_set.h\"\n\nnamespace qx {\n",
-        struct_of("ComplexTransform", p, complex_text(p)),
-        struct_of("RealTransform", p, real_text(p)),
-        struct_of("OddTransform", p, odd_text(p)),
+        *texts,
         f"template <>\nconst KernelSet &KernelsFor<{p}>() {{",
         f"    static constexpr KernelSet kernels = MakeKernels<{p}>();\n    return kernels;\n}}\n",
         "} // namespace qx\n"])

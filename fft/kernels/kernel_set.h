@@ -12,140 +12,159 @@ namespace qx {
 
 // ---- Large bodies stand alone ----
 //
-// From this radix on a transform is so long that one copy of it, between arrays, serves all loops.
-inline constexpr int smallestArrayRadix = 17;
+// The transforms of the larger primes are so long that one copy of each, between arrays, serves all
+// loops. Narrower data rides along in the first lanes, which takes no longer.
 
-template <class V>
-struct ComplexArrayIn {
-    const Complex<V> *x;
-    QX_INLINE Complex<V> at(int j) const { return x[j]; }
+inline constexpr bool standsAlone(int radix) { return radix >= 17 && radix % 2; }
+
+struct PackedArrayIn {
+    const Wide *x;
+    QX_INLINE Wide at(int j) const { return x[j]; }
 };
-template <class V>
-struct ComplexArrayOut {
-    Complex<V> *y;
-    QX_INLINE void set(int k, V re, V im) const { y[k] = {re, im}; }
+struct PackedArrayOut {
+    Wide *y;
+    QX_INLINE void set(int k, Wide x) const { y[k] = x; }
 };
-template <class V>
-struct RealArrayIn {
-    const V *x;
-    QX_INLINE V at(int j) const { return x[j]; }
-};
-template <class V>
 struct RealArrayOut {
-    V *h;
-    QX_INLINE void set(int k, V a) const { h[k] = a; }
-    QX_INLINE void setPair(int k, V a, V b) const {
+    Wide *h;
+    QX_INLINE void set(int k, Wide a) const { h[k] = a; }
+    QX_INLINE void setPair(int k, Wide a, Wide b) const {
         h[k] = a;
         h[k + 1] = b;
     }
 };
 
-template <int P, class V>
-__attribute__((noinline)) void ComplexInArrays(const Complex<V> *x, Complex<V> *y) {
-    ComplexTransform<P>::template run<V>(ComplexArrayIn<V>{x}, ComplexArrayOut<V>{y});
+template <int P>
+__attribute__((noinline)) void PackedInArrays(const Wide *x, Wide *y) {
+    PackedTransform<P>::template run<Wide>(PackedArrayIn{x}, PackedArrayOut{y});
 }
-template <int P, class V>
-__attribute__((noinline)) void RealInArrays(const V *x, V *h) {
-    RealTransform<P>::template run<V>(RealArrayIn<V>{x}, RealArrayOut<V>{h});
+template <int P>
+__attribute__((noinline)) void RealInArrays(const Wide *x, Wide *h) {
+    RealTransform<P>::template run<Wide>(PackedArrayIn{x}, RealArrayOut{h});
 }
 
-inline constexpr bool standsAlone(int radix) { return radix >= smallestArrayRadix && radix % 2; }
+QX_INLINE Wide Widened(Narrow x) { return Wide(x.v); }
+QX_INLINE Wide Widened(Wide x) { return x; }
+#ifdef __AVX__
+QX_INLINE Wide Widened(One x) { return Wide(__builtin_shufflevector(x.v, x.v, 0, 1, 0, 1)); }
+#endif
+
+template <class V>
+QX_INLINE V FirstLanes(Wide x) {
+    if constexpr (V::count == nativeLanes)
+        return x;
+    else if constexpr (V::count == 2)
+        return V(__builtin_shufflevector(x.v, x.v, 0, 1));
+    else
+        return V(x[0]);
+}
 
 template <int P, class V, class In, class Out>
-QX_INLINE void RunComplex(const In &in, const Out &out) {
+QX_INLINE void RunPacked(const In &in, const Out &out) {
     if constexpr (standsAlone(P)) {
-        Complex<V> x[P], y[P];
+        Wide x[P], y[P];
         for (int j = 0; j < P; ++j)
-            x[j] = in.at(j);
-        ComplexInArrays<P, V>(x, y);
+            x[j] = Widened(in.at(j));
+        PackedInArrays<P>(x, y);
         for (int k = 0; k < P; ++k)
-            out.set(k, y[k].re, y[k].im);
+            out.set(k, FirstLanes<V>(y[k]));
     } else {
-        ComplexTransform<P>::template run<V>(in, out);
+        PackedTransform<P>::template run<V>(in, out);
     }
 }
 
 template <int P, class V, class In, class Out>
 QX_INLINE void RunReal(const In &in, const Out &out) {
     if constexpr (standsAlone(P)) {
-        V x[P], h[P];
+        Wide x[P], h[P];
         for (int j = 0; j < P; ++j)
-            x[j] = in.at(j);
-        RealInArrays<P, V>(x, h);
+            x[j] = Widened(in.at(j));
+        RealInArrays<P>(x, h);
         for (int k = 0; k + 1 < P; k += 2)
-            out.setPair(k, h[k], h[k + 1]);
-        out.set(P - 1, h[P - 1]);
+            out.setPair(k, FirstLanes<V>(h[k]), FirstLanes<V>(h[k + 1]));
+        out.set(P - 1, FirstLanes<V>(h[P - 1]));
     } else {
         RealTransform<P>::template run<V>(in, out);
     }
 }
 
-// ---- Complex ----
+// ---- Leaves ----
 
-// The columns of a leaf, nativeLanes at a time; lanes behind the last column repeat it.
-template <class Block>
-QX_INLINE void ForLeafBlocks(const LeafColumns &columns, const Block &block) {
-    ptrdiff_t a = 0;
-    ptrdiff_t b = 0;
-    ptrdiff_t in[nativeLanes];
-    ptrdiff_t out[nativeLanes];
-    while (b < columns.count[1]) {
-        for (int lane = 0; lane < nativeLanes; ++lane) {
-            if (b < columns.count[1]) {
-                in[lane] = a * columns.inStride[0] + b * columns.inStride[1];
-                out[lane] = a * columns.outStride[0] + b * columns.outStride[1];
-                if (++a == columns.count[0]) {
-                    a = 0;
-                    ++b;
-                }
-            } else {
-                in[lane] = in[lane - 1];
-                out[lane] = out[lane - 1];
-            }
+// Walks over the columns of a leaf.
+class ColumnWalk {
+public:
+    explicit ColumnWalk(const LeafColumns &columns) : columns_(columns) {}
+    bool atEnd() const { return b_ == columns_.count[1]; }
+    void take(ptrdiff_t *in, ptrdiff_t *out) {
+        *in = a_ * columns_.inStride[0] + b_ * columns_.inStride[1];
+        *out = a_ * columns_.outStride[0] + b_ * columns_.outStride[1];
+        if (++a_ == columns_.count[0]) {
+            a_ = 0;
+            ++b_;
         }
-        block(in, out);
     }
+
+private:
+    const LeafColumns &columns_;
+    ptrdiff_t a_ = 0;
+    ptrdiff_t b_ = 0;
+};
+
+template <int P>
+__attribute__((noinline)) void ComplexLeafColumn(const ColumnIn &in, const ColumnOut &out) {
+    RunPacked<P, One>(in, out);
 }
 
 template <int P>
 void ComplexLanesLeaf(const DBL *in, DBL *out, const LeafColumns &columns) {
-    if (columns.count[0] * columns.count[1] == 1) {
-        RunComplex<P, Narrow>(ComplexColumnIn{in, in + 1, columns.legStride},
-                              ComplexColumnOut{out, out + 1, 2});
-        return;
-    }
-    ForLeafBlocks(columns, [&](const ptrdiff_t *inAt, const ptrdiff_t *outAt) {
-        ComplexGatherIn x;
-        ComplexScatterOut y;
-        for (int lane = 0; lane < nativeLanes; ++lane) {
-            x.x[lane] = in + inAt[lane];
-            y.y[lane] = out + outAt[lane];
+    ptrdiff_t inAt[packedColumns];
+    ptrdiff_t outAt[packedColumns];
+    ColumnWalk walk(columns);
+    for (ptrdiff_t left = columns.count[0] * columns.count[1]; left > 0; left -= packedColumns) {
+        if (left < packedColumns) {
+            walk.take(inAt, outAt);
+            ComplexLeafColumn<P>({in + *inAt, in + *inAt + 1, columns.legStride},
+                                 {out + *outAt, out + *outAt + 1, 2});
+            return;
+        }
+        PackedGatherIn x;
+        PackedBlocksOut y;
+        for (int i = 0; i < packedColumns; ++i) {
+            walk.take(inAt, outAt);
+            x.x[i] = in + *inAt;
+            y.y[i] = out + *outAt;
         }
         x.leg = columns.legStride;
-        y.leg = 2;
-        RunComplex<P, Wide>(x, y);
-    });
+        RunPacked<P, Wide>(x, y);
+    }
 }
 
 template <int P>
-void ComplexLanesTwiddle(DBL *data, const DBL *lanes, ptrdiff_t m) {
-    const ptrdiff_t leg = 2 * m;
-    ptrdiff_t k = 0;
-    for (; k + nativeLanes <= m; k += nativeLanes) {
-        DBL *const columns = data + 2 * k;
-        RunComplex<P, Wide>(TwiddledLanesIn<ComplexLanesIn>{{columns, leg}, lanes},
-                            ComplexLanesOut{columns, leg});
-        lanes += 2 * nativeLanes * (P - 1);
-    }
-    if (k == m)
+__attribute__((noinline)) void RealLeafColumn(const RealColumnIn &in, const RealColumnOut &out) {
+    RunReal<P, Narrow>(in, out);
+}
+
+// Lanes behind the last column repeat it.
+template <int P>
+void RealLanesLeaf(const DBL *in, DBL *out, const LeafColumns &columns) {
+    if (columns.count[0] * columns.count[1] == 1) {
+        RealLeafColumn<P>({in, columns.legStride}, {out, 1});
         return;
-    TwiddledLanesIn<ComplexGatherIn> in;
-    ComplexScatterOut out;
-    for (int lane = 0; lane < nativeLanes; ++lane)
-        in.columns.x[lane] = out.y[lane] = data + 2 * std::min(k + lane, m - 1);
-    in.columns.leg = out.leg = leg;
-    in.lanes = lanes;
-    RunComplex<P, Wide>(in, out);
+    }
+    for (ColumnWalk walk(columns); !walk.atEnd();) {
+        RealGatherIn x;
+        RealBlocksOut h;
+        ptrdiff_t inAt = 0;
+        ptrdiff_t outAt = 0;
+        for (int lane = 0; lane < nativeLanes; ++lane) {
+            if (!walk.atEnd())
+                walk.take(&inAt, &outAt);
+            x.x[lane] = in + inAt;
+            h.h[lane] = out + outAt;
+        }
+        x.leg = columns.legStride;
+        RunReal<P, Wide>(x, h);
+    }
 }
 
 template <int P>
@@ -157,9 +176,28 @@ void ComplexLeafKernel(const DBL *inRe, const DBL *inIm, DBL *outRe, DBL *outIm,
         return;
     }
     for (ptrdiff_t i = 0; i < count; ++i)
-        RunComplex<P, Narrow>(
-            ComplexColumnIn{inRe + i * inStride, inIm + i * inStride, leg},
-            ComplexColumnOut{outRe + i * P * outStride, outIm + i * P * outStride, outStride});
+        ComplexLeafColumn<P>({inRe + i * inStride, inIm + i * inStride, leg},
+                             {outRe + i * P * outStride, outIm + i * P * outStride, outStride});
+}
+
+template <int P>
+void RealLeafKernel(const DBL *in, DBL *out, ptrdiff_t inStride, ptrdiff_t outStride,
+                    int32_t count) {
+    const ptrdiff_t leg = count * inStride;
+    if (outStride == 1) {
+        RealLanesLeaf<P>(in, out, {{count, 1}, {inStride, 0}, {P, 0}, leg});
+        return;
+    }
+    for (ptrdiff_t i = 0; i < count; ++i)
+        RealLeafColumn<P>({in + i * inStride, leg}, {out + i * P * outStride, outStride});
+}
+
+// ---- Twiddle stages ----
+
+template <int P>
+__attribute__((noinline)) void ComplexTwiddleColumn(const TwiddledColumnIn &in,
+                                                    const ColumnOut &out) {
+    RunPacked<P, One>(in, out);
 }
 
 template <int P>
@@ -173,85 +211,64 @@ void ComplexTwiddleKernel(DBL *re, DBL *im, const DBL *twiddleCos, const DBL *tw
         const ptrdiff_t entry = (k - 1) * (P - 1);
         DBL *const columnRe = re + k * stride;
         DBL *const columnIm = im + k * stride;
-        RunComplex<P, Narrow>(TwiddledColumnIn{{columnRe, columnIm, leg},
-                                               k == 0 ? one : twiddleCos + entry,
-                                               k == 0 ? zero : twiddleSin + entry},
-                              ComplexColumnOut{columnRe, columnIm, leg});
+        ComplexTwiddleColumn<P>({{columnRe, columnIm, leg},
+                                 k == 0 ? one : twiddleCos + entry,
+                                 k == 0 ? zero : twiddleSin + entry},
+                                {columnRe, columnIm, leg});
     }
 }
 
-// ---- Real ----
-
 template <int P>
-void RealLanesLeaf(const DBL *in, DBL *out, const LeafColumns &columns) {
-    if (columns.count[0] * columns.count[1] == 1) {
-        RunReal<P, Narrow>(RealColumnIn{in, columns.legStride}, RealColumnOut{out, 1});
-        return;
+void ComplexLanesTwiddle(DBL *data, const FFTStage &stage, ptrdiff_t m) {
+    const ptrdiff_t leg = 2 * m;
+    const DBL *lanes = stage.complexLanes;
+    ptrdiff_t k = 0;
+    for (; k + packedColumns <= m; k += packedColumns) {
+        DBL *const columns = data + 2 * k;
+        RunPacked<P, Wide>(PackedTwiddledIn{{columns, leg}, lanes}, PackedOut{columns, leg});
+        lanes += nativeLanes * (P - 1);
     }
-    ForLeafBlocks(columns, [&](const ptrdiff_t *inAt, const ptrdiff_t *outAt) {
-        RealBlocksOut h;
-        for (int lane = 0; lane < nativeLanes; ++lane)
-            h.h[lane] = out + outAt[lane];
-        RealGatherIn x;
-        for (int lane = 0; lane < nativeLanes; ++lane)
-            x.x[lane] = in + inAt[lane];
-        x.leg = columns.legStride;
-        RunReal<P, Wide>(x, h);
-    });
-}
-
-template <int P>
-void RealLeafKernel(const DBL *in, DBL *out, ptrdiff_t inStride, ptrdiff_t outStride,
-                    int32_t count) {
-    const ptrdiff_t leg = count * inStride;
-    if (outStride == 1) {
-        RealLanesLeaf<P>(in, out, {{count, 1}, {inStride, 0}, {P, 0}, leg});
-        return;
+    if (k < m) {
+        const ptrdiff_t entry = (k - 1) * (P - 1);
+        DBL *const column = data + 2 * k;
+        ComplexTwiddleColumn<P>(
+            {{column, column + 1, leg}, stage.twiddleCos + entry, stage.twiddleSin + entry},
+            {column, column + 1, leg});
     }
-    for (ptrdiff_t i = 0; i < count; ++i)
-        RunReal<P, Narrow>(RealColumnIn{in + i * inStride, leg},
-                           RealColumnOut{out + i * P * outStride, outStride});
 }
 
 // Columns 0 and, for even m, m / 2: real values in every block.
 template <int P>
 void RealEdgeColumns(DBL *data, ptrdiff_t stride, ptrdiff_t m) {
     const ptrdiff_t leg = m * stride;
-    RunReal<P, Narrow>(RealColumnIn{data, leg}, RealColumnOut{data, leg});
-    if (m % 2 == 0) {
-        DBL *const middle = data + m / 2 * stride;
+    RealLeafColumn<P>({data, leg}, {data, leg});
+    if (m % 2 != 0)
+        return;
+    DBL *const middle = data + m / 2 * stride;
+    if constexpr (P % 2 == 0)
         OddTransform<P>::template run<Narrow>(RealColumnIn{middle, leg},
                                               HalfComplexColumnOut<P>{middle, middle, leg});
-    }
+    else
+        RunReal<P, Narrow>(AlternatingColumnIn{middle, leg}, MiddleColumnOut<P>{middle, leg});
 }
 
 template <int P>
-void RealLanesTwiddle(DBL *data, const DBL *lanes, ptrdiff_t stride, ptrdiff_t m) {
-    RealEdgeColumns<P>(data, stride, m);
+__attribute__((noinline)) void RealPairColumns(const TwiddledColumnIn &in,
+                                               const HalfComplexColumnOut<P> &out) {
+    RunPacked<P, One>(in, out);
+}
+
+// The pairs of columns from k to the last.
+template <int P>
+void RealPairs(DBL *data, const DBL *twiddleCos, const DBL *twiddleSin, ptrdiff_t stride,
+               ptrdiff_t m, ptrdiff_t k) {
     const ptrdiff_t leg = m * stride;
-    const ptrdiff_t last = (m - 1) / 2;
-    ptrdiff_t k = 1;
-    if (stride == 1) {
-        for (; k + nativeLanes - 1 <= last; k += nativeLanes) {
-            DBL *const up = data + k;
-            DBL *const down = data + m - k - (nativeLanes - 1);
-            RunComplex<P, Wide>(TwiddledLanesIn<PairLanesIn>{{up, down, leg}, lanes},
-                                PairLanesOut<P>{up, down, leg});
-            lanes += 2 * nativeLanes * (P - 1);
-        }
-    }
-    for (; k <= last; k += nativeLanes) {
-        TwiddledLanesIn<PairGatherIn> in;
-        PairScatterOut<P> out;
-        for (int lane = 0; lane < nativeLanes; ++lane) {
-            const ptrdiff_t column = std::min(k + lane, last);
-            in.columns.up[lane] = out.up[lane] = data + column * stride;
-            in.columns.down[lane] = out.down[lane] = data + (m - column) * stride;
-        }
-        in.columns.leg = out.leg = leg;
-        in.lanes = lanes;
-        RunComplex<P, Wide>(in, out);
-        lanes += 2 * nativeLanes * (P - 1);
+    for (; k <= (m - 1) / 2; ++k) {
+        const ptrdiff_t entry = (k - 1) * (P - 1);
+        DBL *const up = data + k * stride;
+        DBL *const down = data + (m - k) * stride;
+        RealPairColumns<P>({{up, down, leg}, twiddleCos + entry, twiddleSin + entry},
+                           {up, down, leg});
     }
 }
 
@@ -259,15 +276,24 @@ template <int P>
 void RealTwiddleKernel(DBL *data, const DBL *twiddleCos, const DBL *twiddleSin, ptrdiff_t stride,
                        int32_t m) {
     RealEdgeColumns<P>(data, stride, m);
-    const ptrdiff_t leg = m * stride;
-    for (ptrdiff_t k = 1; k <= (m - 1) / 2; ++k) {
-        const ptrdiff_t entry = (k - 1) * (P - 1);
-        DBL *const up = data + k * stride;
-        DBL *const down = data + (m - k) * stride;
-        RunComplex<P, Narrow>(
-            TwiddledColumnIn{{up, down, leg}, twiddleCos + entry, twiddleSin + entry},
-            HalfComplexColumnOut<P>{up, down, leg});
+    RealPairs<P>(data, twiddleCos, twiddleSin, stride, m, 1);
+}
+
+template <int P>
+void RealLanesTwiddle(DBL *data, const FFTStage &stage, ptrdiff_t m) {
+    RealEdgeColumns<P>(data, 1, m);
+    ptrdiff_t k = 1;
+    if constexpr (!standsAlone(P)) {
+        const DBL *lanes = stage.realLanes;
+        for (; k + nativeLanes - 1 <= (m - 1) / 2; k += nativeLanes) {
+            DBL *const up = data + k;
+            DBL *const down = data + m - k - (nativeLanes - 1);
+            SplitTransform<P>::template run<Wide>(PairLanesIn{up, down, m, lanes},
+                                                  PairLanesOut<P>{up, down, m});
+            lanes += 2 * nativeLanes * (P - 1);
+        }
     }
+    RealPairs<P>(data, stage.twiddleCos, stage.twiddleSin, 1, m, k);
 }
 
 template <int P>

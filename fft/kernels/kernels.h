@@ -31,9 +31,9 @@ struct KernelSet {
     ComplexTwiddle complexTwiddle;
 
     void (*realLanesLeaf)(const DBL *in, DBL *out, const LeafColumns &columns);
-    void (*realLanesTwiddle)(DBL *data, const DBL *lanes, std::ptrdiff_t stride, std::ptrdiff_t m);
+    void (*realLanesTwiddle)(DBL *data, const FFTStage &stage, std::ptrdiff_t m);
     void (*complexLanesLeaf)(const DBL *in, DBL *out, const LeafColumns &columns);
-    void (*complexLanesTwiddle)(DBL *data, const DBL *lanes, std::ptrdiff_t m);
+    void (*complexLanesTwiddle)(DBL *data, const FFTStage &stage, std::ptrdiff_t m);
 };
 
 // The kernels of one of kernelRadices.
@@ -42,9 +42,10 @@ template <int P>
 const KernelSet &KernelsFor();
 
 // The lane tables hold the twiddles of a stage with factor p in the order in which the kernels read
-// them: block after block of columns, in a block for each j from 1 to p - 1 the cosines of all
-// lanes, then the sines. Lanes behind the last column repeat it. The complex table starts at column
-// 0, the real one at column 1 and ends at (m - 1) / 2, for the rest mirrors it.
+// them: block after block of columns, as many as fill the lanes, and in a block entry by entry of
+// j from 1 to p - 1. The complex table starts at column 0 and has packed entries; the real one has
+// columns 1 to (m - 1) / 2, for the rest mirrors them, in an entry all cosines, then all sines.
+// Columns that fill no block are left out.
 int64_t ComplexLanesSize(int32_t p, int32_t m);
 int64_t RealLanesSize(int32_t p, int32_t m);
 void FillComplexLanes(const FFTStage &stage, int32_t p, int32_t m, DBL *lanes);
