@@ -101,7 +101,6 @@ struct Bundle {
     ptrdiff_t inStride;  // from the input of one to that of the next
     ptrdiff_t outStride; // from the results of one to those of the next
 };
-constexpr ptrdiff_t bundleSize = 4;
 
 // What differs between complex and real data.
 struct ComplexLanesPath {
@@ -137,20 +136,24 @@ ErrorCode RecurseLanes(const FFTPlan &plan, int32_t level, int32_t n, const DBL 
     const ptrdiff_t block = m * Path::width;
     ErrorCode status = 0;
     if (level == plan.factorCount - 2) {
-        Path::leaf(*plan.stages[level + 1]->kernels, in, out,
-                   {{bundle.count, p},
-                    {bundle.inStride, inStride},
-                    {bundle.outStride, block},
-                    p * inStride});
+        const KernelSet &kernels = *plan.stages[level + 1]->kernels;
+        if (bundle.count == 1)
+            Path::leaf(kernels, in, out, {{p, 1}, {inStride, 0}, {block, 0}, p * inStride});
+        else
+            Path::leaf(kernels, in, out,
+                       {{bundle.count, p},
+                        {bundle.inStride, inStride},
+                        {bundle.outStride, block},
+                        p * inStride});
     } else if (bundle.count > 1) {
         for (ptrdiff_t j = 0; j < p && status >= 0; ++j)
             status = RecurseLanes<Path>(plan, level + 1, m, in + j * inStride, out + j * block,
                                         p * inStride, bundle);
     } else {
-        for (ptrdiff_t j = 0; j < p && status >= 0; j += bundleSize)
-            status =
-                RecurseLanes<Path>(plan, level + 1, m, in + j * inStride, out + j * block,
-                                   p * inStride, {std::min(bundleSize, p - j), inStride, block});
+        for (ptrdiff_t j = 0; j < p && status >= 0; j += leafBundle)
+            status = RecurseLanes<Path>(plan, level + 1, m, in + j * inStride, out + j * block,
+                                        p * inStride,
+                                        {std::min<ptrdiff_t>(leafBundle, p - j), inStride, block});
     }
     for (ptrdiff_t b = 0; b < bundle.count && status >= 0; ++b)
         status = Path::twiddle(plan, level, out + b * bundle.outStride, m);
@@ -180,9 +183,14 @@ ErrorCode ExecuteComplex(const FFTPlan &plan, const DBL *inRe, const DBL *inIm, 
         outIm[0] = inIm[0];
         return 0;
     }
-    if (plan.factorCount == 1)
-        return RunComplexLeaf(plan, inRe, inIm, outRe, outIm, inStride, outStride, 1);
-    if (inIm == inRe + 1 && outIm == outRe + 1 && outStride == 2 && LeafHasKernels(plan))
+    const bool interleaved = inIm == inRe + 1 && outIm == outRe + 1 && outStride == 2;
+    if (plan.factorCount == 1) {
+        if (!interleaved || inStride != 2 || !LeafHasKernels(plan))
+            return RunComplexLeaf(plan, inRe, inIm, outRe, outIm, inStride, outStride, 1);
+        plan.stages[0]->kernels->complexSideBySide(inRe, outRe);
+        return 0;
+    }
+    if (interleaved && LeafHasKernels(plan))
         return RecurseLanes<ComplexLanesPath>(plan, 0, plan.length, inRe, outRe, inStride,
                                               {1, 0, 0});
     return RecurseComplex(plan, 0, plan.length, inRe, inIm, outRe, outIm, inStride, outStride);
@@ -194,8 +202,12 @@ ErrorCode ExecuteReal(const FFTPlan &plan, const DBL *in, DBL *out, ptrdiff_t in
         out[0] = in[0];
         return 0;
     }
-    if (plan.factorCount == 1)
-        return RunRealLeaf(plan, in, out, inStride, outStride, 1);
+    if (plan.factorCount == 1) {
+        if (inStride != 1 || outStride != 1 || !LeafHasKernels(plan))
+            return RunRealLeaf(plan, in, out, inStride, outStride, 1);
+        plan.stages[0]->kernels->realSideBySide(in, out);
+        return 0;
+    }
     if (outStride == 1 && LeafHasKernels(plan))
         return RecurseLanes<RealLanesPath>(plan, 0, plan.length, in, out, inStride, {1, 0, 0});
     return RecurseReal(plan, 0, plan.length, in, out, inStride, outStride);

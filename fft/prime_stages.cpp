@@ -1,8 +1,10 @@
 #include "fft/prime_stages.h"
 
 #include "fft/execute.h"
+#include "frame/lanes.h"
 #include "frame/scratch.h"
 
+#include <algorithm>
 #include <cstddef>
 
 namespace qx {
@@ -10,15 +12,20 @@ namespace {
 
 using std::ptrdiff_t;
 
+typedef Lanes<2> Pair; // a complex value
+
 // Complex values at a stride.
 struct Input {
     const DBL *re, *im;
     ptrdiff_t stride;
+
+    Pair at(ptrdiff_t i) const { return Pair(Pair::Vector{re[i * stride], im[i * stride]}); }
 };
 struct Output {
     DBL *re, *im;
     ptrdiff_t stride;
 
+    void set(ptrdiff_t i, Pair value) const { set(i, value[0], value[1]); }
     void set(ptrdiff_t i, double real, double imaginary) const {
         re[i * stride] = real;
         im[i * stride] = imaginary;
@@ -35,46 +42,39 @@ ErrorCode DirectComplex(const PrimeFactor &factor, Input x, Output y, DBL *work)
     const ptrdiff_t h = p / 2;
     const DBL *const rootCos = factor.stage->rootCos;
     const DBL *const rootSin = factor.stage->rootSin;
-    const double x0Re = x.re[0];
-    const double x0Im = x.im[0];
-    double sumRe = x0Re;
-    double sumIm = x0Im;
+    const Pair x0 = x.at(0);
+    Pair sum = x0;
     for (ptrdiff_t i = 1; i <= h; ++i) {
-        const ptrdiff_t left = i * x.stride;
-        const ptrdiff_t right = (p - i) * x.stride;
-        DBL *const mirrored = work + 4 * (i - 1);
-        mirrored[0] = x.re[left] + x.re[right];
-        mirrored[1] = x.im[left] - x.im[right];
-        mirrored[2] = x.re[left] - x.re[right];
-        mirrored[3] = x.im[left] + x.im[right];
-        sumRe += mirrored[0];
-        sumIm += mirrored[3];
+        const Pair left = x.at(i);
+        const Pair right = x.at(p - i);
+        (left + right).store(work + 4 * i - 4);
+        // i times the difference
+        const Pair difference = left - right;
+        Pair(Pair::Vector{-difference[1], difference[0]}).store(work + 4 * i - 2);
+        sum = sum + (left + right);
     }
-    y.set(0, sumRe, sumIm);
-    for (ptrdiff_t q = 1; q <= h; ++q) {
-        double re = x0Re;
-        double im = x0Im;
-        double mirrorRe = x0Re;
-        double mirrorIm = x0Im;
-        ptrdiff_t e = 0;
+    y.set(0, sum);
+    // Two sums at a time, for neither has to wait for the other; both are the last if h is odd.
+    for (ptrdiff_t q = 1; q <= h; q += 2) {
+        const ptrdiff_t frequencies[2] = {q, std::min(q + 1, h)};
+        Pair value[2] = {x0, x0};
+        Pair mirrored[2] = {x0, x0};
+        ptrdiff_t e[2] = {0, 0};
         for (ptrdiff_t i = 1; i <= h; ++i) {
-            e += q;
-            if (e >= p)
-                e -= p;
-            const DBL *const mirrored = work + 4 * (i - 1);
-            const double c = rootCos[e];
-            const double s = rootSin[e];
-            const double ac = mirrored[0] * c;
-            const double bs = mirrored[1] * s;
-            const double cs = mirrored[2] * s;
-            const double dc = mirrored[3] * c;
-            re += ac - bs;
-            im += dc + cs;
-            mirrorRe += ac + bs;
-            mirrorIm += dc - cs;
+            for (int which = 0; which < 2; ++which) {
+                e[which] += frequencies[which];
+                if (e[which] >= p)
+                    e[which] -= p;
+                const Pair even = Pair::load(work + 4 * i - 4) * Pair(rootCos[e[which]]);
+                const Pair odd = Pair::load(work + 4 * i - 2) * Pair(rootSin[e[which]]);
+                value[which] = value[which] + (even + odd);
+                mirrored[which] = mirrored[which] + (even - odd);
+            }
         }
-        y.set(q, re, im);
-        y.set(p - q, mirrorRe, mirrorIm);
+        for (int which = 0; which < 2; ++which) {
+            y.set(frequencies[which], value[which]);
+            y.set(p - frequencies[which], mirrored[which]);
+        }
     }
     return 0;
 }

@@ -13,6 +13,25 @@ using std::ptrdiff_t;
 // Columns of packed complex values that stand in one Wide.
 inline constexpr int packedColumns = nativeLanes / 2;
 
+// ---- Columns copied to the stack ----
+//
+// Where the values of a column are a multiple of half a page apart, all of them fall into the same
+// few sets of the cache, and what one column brings in is gone before its neighbour reads it. So
+// several neighbours are copied to the stack at once, by whole cache lines.
+
+inline constexpr bool legsCollide(ptrdiff_t leg, int p) {
+    return p > 4 && leg * ptrdiff_t{sizeof(DBL)} % 2048 == 0;
+}
+
+// `rows` runs of `width` values each.
+template <int Width>
+QX_INLINE void CopyRows(const DBL *from, ptrdiff_t fromPitch, DBL *to, ptrdiff_t toPitch,
+                        int rows) {
+    for (int row = 0; row < rows; ++row)
+        for (int i = 0; i < Width; i += nativeLanes)
+            Wide::load(from + row * fromPitch + i).store(to + row * toPitch + i);
+}
+
 // ---- One column, any strides ----
 
 struct ColumnIn {
@@ -28,6 +47,17 @@ struct ColumnOut {
         re[k * leg] = x[0];
         im[k * leg] = x[1];
     }
+};
+
+// Interleaved and side by side.
+struct SideBySideIn {
+    const DBL *x;
+    QX_INLINE One at(int j) const { return One::load(x + 2 * j); }
+};
+
+struct SideBySideOut {
+    DBL *y;
+    QX_INLINE void set(int k, One x) const { x.store(y + 2 * k); }
 };
 
 // With the twiddles of the column, those of j = 1 first.

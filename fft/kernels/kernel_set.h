@@ -116,7 +116,13 @@ __attribute__((noinline)) void ComplexLeafColumn(const ColumnIn &in, const Colum
 }
 
 template <int P>
-void ComplexLanesLeaf(const DBL *in, DBL *out, const LeafColumns &columns) {
+void ComplexSideBySide(const DBL *in, DBL *out) {
+    RunPacked<P, One>(SideBySideIn{in}, SideBySideOut{out});
+}
+
+template <int P>
+__attribute__((noinline)) void ComplexLeafWalk(const DBL *in, DBL *out,
+                                               const LeafColumns &columns) {
     ptrdiff_t inAt[packedColumns];
     ptrdiff_t outAt[packedColumns];
     ColumnWalk walk(columns);
@@ -140,17 +146,34 @@ void ComplexLanesLeaf(const DBL *in, DBL *out, const LeafColumns &columns) {
 }
 
 template <int P>
+void ComplexLanesLeaf(const DBL *in, DBL *out, const LeafColumns &columns) {
+    constexpr int width = 2 * leafBundle;
+    if (columns.count[0] != leafBundle || columns.inStride[0] != 2 ||
+        !legsCollide(columns.legStride, P)) {
+        ComplexLeafWalk<P>(in, out, columns);
+        return;
+    }
+    double rows[P * width];
+    const LeafColumns onStack = {{leafBundle, 1}, {2, 0}, {columns.outStride[0], 0}, width};
+    for (ptrdiff_t b = 0; b < columns.count[1]; ++b) {
+        CopyRows<width>(in + b * columns.inStride[1], columns.legStride, rows, width, P);
+        ComplexLeafWalk<P>(rows, out + b * columns.outStride[1], onStack);
+    }
+}
+
+template <int P>
 __attribute__((noinline)) void RealLeafColumn(const RealColumnIn &in, const RealColumnOut &out) {
     RunReal<P, Narrow>(in, out);
 }
 
-// Lanes behind the last column repeat it.
 template <int P>
-void RealLanesLeaf(const DBL *in, DBL *out, const LeafColumns &columns) {
-    if (columns.count[0] * columns.count[1] == 1) {
-        RealLeafColumn<P>({in, columns.legStride}, {out, 1});
-        return;
-    }
+void RealSideBySide(const DBL *in, DBL *out) {
+    RunReal<P, Narrow>(RealColumnIn{in, 1}, RealColumnOut{out, 1});
+}
+
+// Columns in any place; lanes behind the last one repeat it.
+template <int P>
+__attribute__((noinline)) void RealLeafWalk(const DBL *in, DBL *out, const LeafColumns &columns) {
     for (ColumnWalk walk(columns); !walk.atEnd();) {
         RealGatherIn x;
         RealBlocksOut h;
@@ -164,6 +187,46 @@ void RealLanesLeaf(const DBL *in, DBL *out, const LeafColumns &columns) {
         }
         x.leg = columns.legStride;
         RunReal<P, Wide>(x, h);
+    }
+}
+
+// Rows of neighbouring columns.
+template <int P>
+__attribute__((noinline)) void RealLeafRows(const DBL *in, DBL *out, const LeafColumns &columns) {
+    const ptrdiff_t whole = columns.count[0] - columns.count[0] % nativeLanes;
+    for (ptrdiff_t b = 0; b < columns.count[1]; ++b) {
+        const DBL *const row = in + b * columns.inStride[1];
+        DBL *const results = out + b * columns.outStride[1];
+        for (ptrdiff_t a = 0; a < whole; a += nativeLanes) {
+            RealBlocksOut h;
+            for (int lane = 0; lane < nativeLanes; ++lane)
+                h.h[lane] = results + (a + lane) * columns.outStride[0];
+            RunReal<P, Wide>(RealLanesIn{row + a, columns.legStride}, h);
+        }
+        if (whole < columns.count[0])
+            RealLeafWalk<P>(row + whole, results + whole * columns.outStride[0],
+                            {{columns.count[0] - whole, 1},
+                             {1, 0},
+                             {columns.outStride[0], 0},
+                             columns.legStride});
+    }
+}
+
+template <int P>
+void RealLanesLeaf(const DBL *in, DBL *out, const LeafColumns &columns) {
+    if (columns.inStride[0] != 1 || columns.count[0] < nativeLanes) {
+        RealLeafWalk<P>(in, out, columns);
+        return;
+    }
+    if (columns.count[0] != leafBundle || !legsCollide(columns.legStride, P)) {
+        RealLeafRows<P>(in, out, columns);
+        return;
+    }
+    double rows[P * leafBundle];
+    const LeafColumns onStack = {{leafBundle, 1}, {1, 0}, {columns.outStride[0], 0}, leafBundle};
+    for (ptrdiff_t b = 0; b < columns.count[1]; ++b) {
+        CopyRows<leafBundle>(in + b * columns.inStride[1], columns.legStride, rows, leafBundle, P);
+        RealLeafRows<P>(rows, out + b * columns.outStride[1], onStack);
     }
 }
 
@@ -218,19 +281,36 @@ void ComplexTwiddleKernel(DBL *re, DBL *im, const DBL *twiddleCos, const DBL *tw
     }
 }
 
+// `count` neighbouring columns, as many as fill the lanes.
+template <int P>
+__attribute__((noinline)) void ComplexTwiddleColumns(DBL *columns, ptrdiff_t leg, ptrdiff_t count,
+                                                     const DBL *lanes) {
+    for (ptrdiff_t k = 0; k < count; k += packedColumns) {
+        DBL *const at = columns + 2 * k;
+        RunPacked<P, Wide>(PackedTwiddledIn{{at, leg}, lanes}, PackedOut{at, leg});
+        lanes += nativeLanes * (P - 1);
+    }
+}
+
 template <int P>
 void ComplexLanesTwiddle(DBL *data, const FFTStage &stage, ptrdiff_t m) {
     const ptrdiff_t leg = 2 * m;
-    const DBL *lanes = stage.complexLanes;
-    ptrdiff_t k = 0;
-    for (; k + packedColumns <= m; k += packedColumns) {
-        DBL *const columns = data + 2 * k;
-        RunPacked<P, Wide>(PackedTwiddledIn{{columns, leg}, lanes}, PackedOut{columns, leg});
-        lanes += nativeLanes * (P - 1);
+    if (legsCollide(leg, P)) { // m is a multiple of the columns that are copied
+        constexpr ptrdiff_t copied = 8;
+        constexpr int width = 2 * copied;
+        double rows[P * width];
+        for (ptrdiff_t k = 0; k < m; k += copied) {
+            CopyRows<width>(data + 2 * k, leg, rows, width, P);
+            ComplexTwiddleColumns<P>(rows, width, copied, stage.complexLanes + 2 * k * (P - 1));
+            CopyRows<width>(rows, width, data + 2 * k, leg, P);
+        }
+        return;
     }
-    if (k < m) {
-        const ptrdiff_t entry = (k - 1) * (P - 1);
-        DBL *const column = data + 2 * k;
+    const ptrdiff_t whole = m - m % packedColumns;
+    ComplexTwiddleColumns<P>(data, leg, whole, stage.complexLanes);
+    if (whole < m) {
+        const ptrdiff_t entry = (whole - 1) * (P - 1);
+        DBL *const column = data + 2 * whole;
         ComplexTwiddleColumn<P>(
             {{column, column + 1, leg}, stage.twiddleCos + entry, stage.twiddleSin + entry},
             {column, column + 1, leg});
@@ -279,27 +359,54 @@ void RealTwiddleKernel(DBL *data, const DBL *twiddleCos, const DBL *twiddleSin, 
     RealPairs<P>(data, twiddleCos, twiddleSin, stride, m, 1);
 }
 
+// `count` neighbouring pairs of columns, as many as fill the lanes; `down` is behind the highest of
+// the mirrored columns.
+template <int P>
+__attribute__((noinline)) void RealPairLanes(DBL *up, DBL *down, ptrdiff_t leg, ptrdiff_t count,
+                                             const DBL *lanes) {
+    for (ptrdiff_t k = 0; k < count; k += nativeLanes) {
+        down -= nativeLanes;
+        SplitTransform<P>::template run<Wide>(PairLanesIn{up, down, leg, lanes},
+                                              PairLanesOut<P>{up, down, leg});
+        up += nativeLanes;
+        lanes += 2 * nativeLanes * (P - 1);
+    }
+}
+
 template <int P>
 void RealLanesTwiddle(DBL *data, const FFTStage &stage, ptrdiff_t m) {
     RealEdgeColumns<P>(data, 1, m);
     ptrdiff_t k = 1;
     if constexpr (!standsAlone(P)) {
-        const DBL *lanes = stage.realLanes;
-        for (; k + nativeLanes - 1 <= (m - 1) / 2; k += nativeLanes) {
-            DBL *const up = data + k;
-            DBL *const down = data + m - k - (nativeLanes - 1);
-            SplitTransform<P>::template run<Wide>(PairLanesIn{up, down, m, lanes},
-                                                  PairLanesOut<P>{up, down, m});
-            lanes += 2 * nativeLanes * (P - 1);
+        constexpr int copied = 8;
+        if (legsCollide(m, P)) {
+            double rows[2 * P * copied];
+            for (; k + copied - 1 <= (m - 1) / 2; k += copied) {
+                DBL *const up = data + k;
+                DBL *const down = data + m - k - (copied - 1);
+                CopyRows<copied>(up, m, rows, 2 * copied, P);
+                CopyRows<copied>(down, m, rows + copied, 2 * copied, P);
+                RealPairLanes<P>(rows, rows + 2 * copied, 2 * copied, copied,
+                                 stage.realLanes + 2 * (k - 1) * (P - 1));
+                CopyRows<copied>(rows, 2 * copied, up, m, P);
+                CopyRows<copied>(rows + copied, 2 * copied, down, m, P);
+            }
         }
+        const ptrdiff_t left = (m - 1) / 2 - (k - 1);
+        const ptrdiff_t whole = left - left % nativeLanes;
+        RealPairLanes<P>(data + k, data + m - k + 1, m, whole,
+                         stage.realLanes + 2 * (k - 1) * (P - 1));
+        k += whole;
     }
     RealPairs<P>(data, stage.twiddleCos, stage.twiddleSin, 1, m, k);
 }
 
 template <int P>
 constexpr KernelSet MakeKernels() {
-    return {RealLeafKernel<P>, RealTwiddleKernel<P>, ComplexLeafKernel<P>, ComplexTwiddleKernel<P>,
-            RealLanesLeaf<P>,  RealLanesTwiddle<P>,  ComplexLanesLeaf<P>,  ComplexLanesTwiddle<P>};
+    return {RealLeafKernel<P>,       RealTwiddleKernel<P>,   ComplexLeafKernel<P>,
+            ComplexTwiddleKernel<P>, RealLanesLeaf<P>,       RealLanesTwiddle<P>,
+            ComplexLanesLeaf<P>,     ComplexLanesTwiddle<P>, ComplexSideBySide<P>,
+            RealSideBySide<P>};
 }
 
 } // namespace qx

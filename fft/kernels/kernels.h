@@ -21,6 +21,9 @@ struct LeafColumns {
     std::ptrdiff_t legStride;
 };
 
+// So many transforms of neighbouring inputs run together where the length allows it.
+inline constexpr int leafBundle = 8;
+
 // The kernels of one radix. The first four take any strides. The others run in SIMD lanes: complex
 // data is interleaved, results lie side by side, and twiddles come from the lane tables. Both give
 // the same bits.
@@ -34,6 +37,9 @@ struct KernelSet {
     void (*realLanesTwiddle)(DBL *data, const FFTStage &stage, std::ptrdiff_t m);
     void (*complexLanesLeaf)(const DBL *in, DBL *out, const LeafColumns &columns);
     void (*complexLanesTwiddle)(DBL *data, const FFTStage &stage, std::ptrdiff_t m);
+    // One transform, its input side by side too.
+    void (*complexSideBySide)(const DBL *in, DBL *out);
+    void (*realSideBySide)(const DBL *in, DBL *out);
 };
 
 // The kernels of one of kernelRadices.
