@@ -1,4 +1,5 @@
 #include "fft/plan.h"
+#include "tests/support/heap_probe.h"
 
 #include <gtest/gtest.h>
 
@@ -118,6 +119,26 @@ TEST(Plan, HoldsTheRootsAtTheirPlaces) {
         EXPECT_EQ(rader.raderGather[i] * power % 73, 1);
         power = power * 5 % 73;
     }
+}
+
+// Each allocation of a plan with three sub-plans fails in turn: nothing stays behind.
+TEST(Plan, IsBuiltWholeOrNotAtAll) {
+    if (!qx::test::HeapProbe::works())
+        GTEST_SKIP();
+    const PlanReference held(52);
+    int32_t failures = 0;
+    for (FFTPlan *plan = nullptr; plan == nullptr; ++failures) {
+        const qx::test::HeapProbe probe(failures + 1);
+        plan = qx::create_oxfft_table(107 * 32 * 23);
+        const int32_t holders = held.get()->refCount;
+        qx::destroy_oxfft_table(plan);
+        EXPECT_EQ(probe.liveAllocations(), 0) << "allocation " << failures + 1;
+        EXPECT_EQ(holders, plan == nullptr ? 1 : 2);
+        ASSERT_LT(failures, 200);
+    }
+    EXPECT_GT(failures, 30);
+    EXPECT_EQ(held.get()->refCount, 1);
+    EXPECT_EQ(held.get()->next, nullptr);
 }
 
 TEST(Plan, TableThatCannotBeHeldIsNull) {

@@ -1,10 +1,13 @@
 #include "fft/plan.h"
+#include "frame/workspace.h"
 
 #include <gtest/gtest.h>
 
 #include <cmath>
 #include <complex>
 #include <cstdint>
+#include <cstring>
+#include <thread>
 #include <vector>
 
 namespace {
@@ -83,6 +86,209 @@ TEST(Transform, FollowsTheDefinition) {
         CheckLength(n);
     for (const int32_t n : {1000, 1024, 1058, 1081, 2048, 2209, 2809, 43 * 41, 37 * 31, 1021, 1283})
         CheckLength(n);
+}
+
+// Single frequencies of long transforms, where columns are copied and bundled.
+TEST(Transform, FollowsTheDefinitionAtGreatLengths) {
+    for (const int32_t n : {16384, 32768, 65536, 131072, 100000, 46656, 53 * 4096, 23 * 2048}) {
+        SCOPED_TRACE(n);
+        const PlanReference plan(n);
+        const std::vector<double> x = Noise(2 * n, n);
+        std::vector<double> y(2 * n), h(n);
+        ASSERT_EQ(0, qx::FFTComplexForward(plan.get(), &x[0], &x[1], &y[0], &y[1], 2, 2, n));
+        ASSERT_EQ(0, qx::FFTRealForward(plan.get(), x.data(), h.data(), 2, 1, n));
+        std::vector<Complex> roots(n);
+        for (int32_t k = 0; k < n; ++k)
+            roots[k] = std::polar(1.0L, -8 * std::atan(1.0L) * k / n);
+        for (const int64_t k : {0, 1, 7, n / 32 + 1, n / 3, n / 2 - 1, n / 2, n - 1}) {
+            Complex complex, real;
+            for (int64_t j = 0; j < n; ++j) {
+                complex += Complex(x[2 * j], x[2 * j + 1]) * roots[j * k % n];
+                real += Complex(x[2 * j]) * roots[j * k % n];
+            }
+            const double tolerance = 1e-14 * std::sqrt(n);
+            EXPECT_NEAR(y[2 * k], complex.real(), tolerance) << k;
+            EXPECT_NEAR(y[2 * k + 1], complex.imag(), tolerance) << k;
+            EXPECT_NEAR(h[k], 2 * k <= n ? real.real() : -real.imag(), tolerance) << k;
+        }
+    }
+}
+
+// Values at a stride, at 4 modulo 16 as the host has them, with untouched memory between them.
+class Strided {
+public:
+    Strided(std::size_t n, std::ptrdiff_t stride)
+        : stride_(stride), bytes_(8 * n * stride + 32, 0x5A) {}
+    DBL *data() {
+        const auto address = reinterpret_cast<std::uintptr_t>(bytes_.data());
+        return reinterpret_cast<DBL *>(bytes_.data() + (20 - address % 16) % 16);
+    }
+    DBL &operator[](std::size_t i) { return data()[i * stride_]; }
+    int32_t stride() const { return static_cast<int32_t>(stride_); }
+    bool gapsUntouched(std::size_t n) {
+        for (std::size_t i = 0; i + 1 < n * stride_; ++i)
+            for (std::size_t byte = 0; byte < 8; ++byte)
+                if (i % stride_ != 0 && reinterpret_cast<unsigned char *>(data() + i)[byte] != 0x5A)
+                    return false;
+        return true;
+    }
+
+private:
+    std::ptrdiff_t stride_;
+    std::vector<unsigned char> bytes_;
+};
+
+// One length at other strides and alignments, in parts of their own: the same bits.
+void CheckStrides(int32_t n) {
+    SCOPED_TRACE(n);
+    const PlanReference plan(n);
+    const std::vector<double> x = Noise(2 * n, n);
+    std::vector<double> y(2 * n), h(n);
+    ASSERT_EQ(0, qx::FFTComplexForward(plan.get(), &x[0], &x[1], &y[0], &y[1], 2, 2, n));
+    ASSERT_EQ(0, qx::FFTRealForward(plan.get(), x.data(), h.data(), 2, 1, n));
+    for (const int32_t stride : {1, 2, 3}) {
+        Strided inRe(n, stride), inIm(n, stride), re(n, 4 - stride), im(n, 4 - stride);
+        Strided interleaved(2 * n, 1);
+        for (int32_t i = 0; i < n; ++i) {
+            inRe[i] = x[2 * i];
+            inIm[i] = x[2 * i + 1];
+        }
+        ASSERT_EQ(0, qx::FFTComplexForward(plan.get(), inRe.data(), inIm.data(), re.data(),
+                                           im.data(), stride, re.stride(), n));
+        ASSERT_EQ(0, qx::FFTComplexForward(plan.get(), &x[0], &x[1], interleaved.data(),
+                                           interleaved.data() + 1, 2, 2, n));
+        bool same = re.gapsUntouched(n) && im.gapsUntouched(n);
+        for (int32_t i = 0; i < n; ++i)
+            same = same && re[i] == y[2 * i] && im[i] == y[2 * i + 1] &&
+                   interleaved[2 * i] == y[2 * i] && interleaved[2 * i + 1] == y[2 * i + 1];
+        EXPECT_TRUE(same) << "complex, stride " << stride;
+        Strided half(n, stride);
+        ASSERT_EQ(0, qx::FFTRealForward(plan.get(), inRe.data(), half.data(), stride, stride, n));
+        same = half.gapsUntouched(n);
+        for (int32_t i = 0; i < n; ++i)
+            same = same && half[i] == h[i];
+        EXPECT_TRUE(same) << "real, stride " << stride;
+    }
+}
+
+TEST(Transform, GivesTheSameBitsAtEveryStrideAndAlignment) {
+    for (int32_t n = 1; n <= 70; ++n)
+        CheckStrides(n);
+    for (const int32_t n :
+         {100, 107, 210, 529, 720, 1000, 1024, 2048, 2809, 8192, 17 * 1024, 24010})
+        CheckStrides(n);
+}
+
+// The kernels themselves, as the plan holds them: leaves over several columns.
+TEST(Transform, LeafKernelsTakeColumns) {
+    constexpr int32_t count = 5;
+    for (const int32_t p :
+         {2, 3, 4, 5, 7, 8, 9, 10, 11, 13, 14, 16, 17, 18, 19, 29, 31, 32, 37, 41, 43}) {
+        SCOPED_TRACE(p);
+        const PlanReference plan(p);
+        const FFTPlan &table = *plan.get();
+        ASSERT_EQ(table.factorCount, 1);
+        ASSERT_EQ(table.factors[0], p);
+        const std::vector<double> x = Noise(2 * p * count, p);
+        std::vector<double> y(2 * p * count), h(p * count);
+        table.complexLeaf[0](&x[0], &x[1], &y[0], &y[1], 2, 2, count);
+        table.realLeaf[0](x.data(), h.data(), 2, 1, count);
+        for (int32_t i = 0; i < count; ++i) {
+            std::vector<double> column, real;
+            for (int32_t j = 0; j < p; ++j) {
+                column.insert(column.end(), {x[2 * (i + j * count)], x[2 * (i + j * count) + 1]});
+                real.insert(real.end(), {x[2 * (i + j * count)], 0});
+            }
+            const DBL *const results = &y[2 * i * p];
+            EXPECT_LT(WorstComplex(Definition(column), results, results + 1, 2), 3e-15 * p);
+            EXPECT_LT(WorstHalf(Definition(real), &h[i * p], 1), 3e-15 * p);
+        }
+    }
+}
+
+TEST(Transform, SmallLengthsByHand) {
+    const double x[] = {1, 2, 4, 8};
+    double y[4];
+    const PlanReference two(2), four(4), one(1);
+    ASSERT_EQ(0, qx::FFTRealForward(two.get(), x, y, 1, 1, 2));
+    EXPECT_EQ(y[0], 3);
+    EXPECT_EQ(y[1], -1);
+    ASSERT_EQ(0, qx::FFTRealForward(four.get(), x, y, 1, 1, 4));
+    EXPECT_EQ(std::vector<double>(y, y + 4), (std::vector<double>{15, -3, -5, 6}));
+    ASSERT_EQ(0, qx::FFTComplexInverse(one.get(), x, x + 1, y, y + 1, 2, 2, 1));
+    EXPECT_EQ(y[0], 1);
+    EXPECT_EQ(y[1], 2);
+}
+
+TEST(Transform, RefusesAnotherLength) {
+    const PlanReference plan(8);
+    std::vector<double> x = Noise(32), y(32);
+    EXPECT_EQ(-1, qx::FFTComplexForward(plan.get(), &x[0], &x[1], &y[0], &y[1], 2, 2, 9));
+    EXPECT_EQ(-1, qx::FFTComplexInverse(plan.get(), &x[0], &x[1], &y[0], &y[1], 2, 2, 9));
+    EXPECT_EQ(ErrInternal, qx::FFTRealForward(plan.get(), &x[0], &y[0], 1, 1, 9));
+    EXPECT_EQ(ErrInternal, qx::FFTRealInverse(plan.get(), &x[0], &y[0], 1, 1, 9));
+    EXPECT_EQ(x, Noise(32));
+    EXPECT_EQ(y, std::vector<double>(32));
+}
+
+// The inverse works in its input: scaled, and turned into the Hartley form.
+TEST(Transform, RealInverseLeavesTheHartleyForm) {
+    const PlanReference plan(5);
+    std::vector<double> h = {5, 10, 15, 20, 30}, out(5);
+    ASSERT_EQ(0, qx::FFTRealInverse(plan.get(), h.data(), out.data(), 1, 1, 5));
+    const double expected[] = {1, 2 - 6, 3 - 4, 4 + 3, 6 + 2};
+    for (int32_t i = 0; i < 5; ++i)
+        EXPECT_NEAR(h[i], expected[i], 1e-15);
+}
+
+TEST(Transform, ThreadsShareAPlan) {
+    for (const int32_t n : {1000, 107, 46}) {
+        const PlanReference plan(n);
+        const std::vector<double> x = Noise(2 * n);
+        std::vector<double> expected(2 * n);
+        qx::FFTComplexForward(plan.get(), &x[0], &x[1], &expected[0], &expected[1], 2, 2, n);
+        int32_t equal[4] = {};
+        std::vector<std::thread> threads;
+        for (int32_t &mine : equal) {
+            threads.emplace_back([&x, &expected, &mine, n] {
+                for (int32_t i = 0; i < 50; ++i) {
+                    const PlanReference own(n);
+                    const PlanReference passing(n + 1 + i % 3);
+                    std::vector<double> y(2 * n);
+                    qx::FFTComplexForward(own.get(), &x[0], &x[1], &y[0], &y[1], 2, 2, n);
+                    mine += y == expected;
+                }
+            });
+        }
+        for (std::thread &thread : threads)
+            thread.join();
+        for (const int32_t mine : equal)
+            EXPECT_EQ(mine, 50);
+        EXPECT_EQ(plan.get()->refCount, 1);
+    }
+}
+
+// Kernels need no scratch memory; the other primes report its lack, in leaves and in stages.
+TEST(Transform, PrimesReportMissingScratchMemory) {
+    ASSERT_EQ(0, qx::analysisWorkspace.reserve(64));
+    ASSERT_EQ(0, qx::analysisWorkspace.setEnabled(true));
+    for (const int32_t n : {23, 47, 53, 107, 46, 106, 2809, 23 * 32, 1000, 41 * 43}) {
+        const bool kernelsOnly = n == 1000 || n == 41 * 43;
+        const ErrorCode expected = kernelsOnly ? 0 : ErrOutOfMemory;
+        SCOPED_TRACE(n);
+        qx::analysisWorkspace.setEnabled(false);
+        const PlanReference plan(n);
+        qx::analysisWorkspace.setEnabled(true);
+        std::vector<double> x = Noise(2 * n), y(2 * n);
+        EXPECT_EQ(expected, qx::FFTComplexForward(plan.get(), &x[0], &x[1], &y[0], &y[1], 2, 2, n));
+        EXPECT_EQ(expected, qx::FFTComplexForward(plan.get(), &x[0], &x[n], &y[0], &y[n], 1, 1, n));
+        EXPECT_EQ(expected, qx::FFTRealForward(plan.get(), &x[0], &y[0], 1, 1, n));
+        EXPECT_EQ(expected, qx::FFTRealForward(plan.get(), &x[0], &y[0], 1, 2, n));
+        EXPECT_EQ(expected, qx::FFTRealInverse(plan.get(), &x[0], &y[0], 1, 1, n));
+        EXPECT_EQ(0, qx::analysisWorkspace.liveBlocks());
+    }
+    qx::analysisWorkspace.setEnabled(false);
+    ASSERT_EQ(0, qx::analysisWorkspace.giveBack());
 }
 
 } // namespace
