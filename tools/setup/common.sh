@@ -48,10 +48,8 @@ debian_source_lists() {
         grep -v '^#' "$list" | awk 'BEGIN { RS = ""; ORS = "\n\n" } /URIs:[^\n]*debian/' |
             sed 's/^Types:.*/Types: deb-src/' >>"$folder/parts/debian.sources"
     done
-    if [ ! -s "$folder/parts/debian.list" ] && [ ! -s "$folder/parts/debian.sources" ]; then
-        echo "deb-src [signed-by=/usr/share/keyrings/debian-archive-keyring.gpg]" \
-            "http://deb.debian.org/debian bookworm main" >"$folder/parts/debian.list"
-    fi
+    [ -s "$folder/parts/debian.list" ] || [ -s "$folder/parts/debian.sources" ] ||
+        fail "no Debian source among /etc/apt/sources.list*, so no source package can be fetched"
 }
 
 debian_source() {
@@ -86,5 +84,6 @@ debian_mirror() {
     local mirror
     mirror=$(apt-get indextargets --format '$(SITE) $(RELEASE)' 'Created-By: Packages' 2>/dev/null |
         awk '$2 == "bookworm" || $2 == "stable" { print $1; exit }')
-    echo "${mirror:-http://deb.debian.org/debian}"
+    [ -n "$mirror" ] || fail "no Debian mirror among /etc/apt/sources.list*"
+    echo "$mirror"
 }
