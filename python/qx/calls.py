@@ -100,11 +100,12 @@ class Export:
         self.names = [a["name"] + "_" * keyword.iskeyword(a["name"]) for a in self.given]
         self.gives_value = entry["returns"] not in ("ErrorCode", "void") and not self.has_error
         self.is_scalar = bool(self.given) and all(
-            a["kind"] in ("value", "reference", "output", "error") for a in self.arguments)
-        self.is_function = self.gives_value and self.is_scalar and all(
-            a["kind"] == "value" and a["element"] in C_TYPES for a in self.arguments)
-        if self.is_function:
-            self.function.argtypes = [C_TYPES[a["element"]] for a in self.arguments]
+            a["kind"] in ("value", "reference", "output", "error") for a in self.arguments) and all(
+            a["element"] in C_TYPES for a in self.arguments if a["kind"] == "value")
+        if self.is_scalar:
+            self.function.argtypes = [
+                C_TYPES[a["element"]] if a["kind"] == "value" else ctypes.c_void_p
+                for a in self.arguments]
 
     @staticmethod
     def _is_given(argument):
@@ -140,7 +141,7 @@ class Export:
             return self._mapped(values)
         return self._called(values)
 
-    def _called(self, values, place="", warned=None):
+    def _called(self, values):
         lengths = tuple(map(self._length, self.given, values)) if self.has_plan else ()
         values = iter(values)
         c_arguments, kept = [], []
@@ -150,7 +151,7 @@ class Export:
             c_arguments.append(c_argument)
             kept.append(keep)
         result = self.function(*c_arguments)
-        return self._finish(result, kept, place, warned)
+        return self._finish(result, kept)
 
     def _prepare(self, argument, value, lengths):
         """What the function is given, and what is kept to read results from."""
@@ -188,7 +189,7 @@ class Export:
             return (ctypes.byref(pointer) if argument["direction"] == "out" else pointer), pointer
         raise TypeError(f"{self.name} takes a {kind}, which cannot be given from Python")
 
-    def _finish(self, result, kept, place, warned):
+    def _finish(self, result, kept):
         results = []
         for argument, keep in zip(self.arguments, kept):
             if argument["direction"] == "in" or argument["kind"] in ("slot", "instance", "error"):
@@ -205,33 +206,52 @@ class Export:
         if status == 0 and (self.has_error or self.entry["returns"] == "ErrorCode"):
             status = result or 0
         if status < 0 or status in HOST_FAILURES:
-            raise QxError(self.name, status, dict(zip([a["name"] for a in self.taken], results)),
-                          place)
+            raise QxError(self.name, status, dict(zip([a["name"] for a in self.taken], results)))
         if status > 0:
-            if warned is None:
-                warnings.warn(QxWarning(self.name, status), stacklevel=5)
-            else:
-                warned.add(status)
+            warnings.warn(QxWarning(self.name, status), stacklevel=5)
         if not results:
             return result if self.gives_value else None
         return results[0] if len(results) == 1 else tuple(results)
 
     def _mapped(self, values):
-        """A function of scalars over arrays, element by element, with NumPy's broadcasting."""
+        """A function of scalars over arrays, element by element, with NumPy's broadcasting. The
+        function writes straight into the elements of the result."""
         spread = np.broadcast_arrays(*[
             arrays.checked(value, arrays.element_dtype(a["element"]), np.ndim(value), a["name"])
             for value, a in zip(values, self.given)])
-        shape = spread[0].shape
-        rows = zip(*[array.ravel().tolist() for array in spread])
-        if self.is_function:
-            return np.array([self.function(*row) for row in rows], float).reshape(shape)
-        warned = set()
-        found = [self._called(row, f" at element {i}", warned) for i, row in enumerate(rows)]
-        for status in sorted(warned):
-            warnings.warn(QxWarning(self.name, status), stacklevel=4)
-        if found and isinstance(found[0], tuple):
-            return tuple(np.array(column).reshape(shape) for column in zip(*found))
-        return np.array(found, None if found else float).reshape(shape)
+        shape, n = spread[0].shape, spread[0].size
+        spread = iter(spread)
+        columns, results, codes = [], [], None
+        for argument in self.arguments:
+            dtype = arrays.element_dtype(argument["element"])
+            if self._is_given(argument):
+                data = np.ascontiguousarray(next(spread), dtype).ravel()
+                if argument["kind"] == "value":
+                    columns.append(data.tolist())
+                    continue
+            else:
+                data = np.zeros(n, dtype)
+            if argument["kind"] == "error":
+                codes = data
+            elif argument["direction"] == "out":
+                results.append(data.reshape(shape))
+            start = data.ctypes.data
+            columns.append(range(start, start + n * dtype.itemsize, dtype.itemsize))
+        returned = [self.function(*row) for row in zip(*columns)]
+        if self.entry["returns"] == "ErrorCode":
+            codes = np.array(returned, np.int32)
+        if codes is not None:
+            self._check_mapped(codes)
+        if self.gives_value:
+            results = [np.array(returned, None if n else float).reshape(shape), *results]
+        return results[0] if len(results) == 1 else tuple(results)
+
+    def _check_mapped(self, codes):
+        failed = np.flatnonzero(codes < 0)
+        if len(failed):
+            raise QxError(self.name, int(codes[failed[0]]), place=f" at element {failed[0]}")
+        for code in np.unique(codes[codes > 0]):
+            warnings.warn(QxWarning(self.name, int(code)), stacklevel=5)
 
 
 @functools.lru_cache(maxsize=None)

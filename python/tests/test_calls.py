@@ -171,6 +171,12 @@ class Scalars(unittest.TestCase):
         self.assertEqual(qx.call("QX_BesselJr", 0.5, 2.0), found[1, 0])
         self.assertEqual(qx.call("QX_BesselJr", 0.5, []).shape, (0,))
         self.assertRaises(TypeError, qx.call, "QX_BesselJr", 0.5, x * 1j)
+        orders = qx.call("QX_BesselJs", np.arange(4)[:, np.newaxis], x[0])
+        self.assertEqual(orders.shape, (4, 2))
+        np.testing.assert_allclose(orders[0], np.sin(x[0]) / x[0], rtol=1e-12)
+        several = qx.call("QX_EllipticJ", x, 0.5)
+        self.assertEqual([part.shape for part in several], 4 * [(2, 2)])
+        np.testing.assert_allclose(several[0]**2 + several[1]**2, 1.0, rtol=1e-12)
 
 
 class Finding(unittest.TestCase):
