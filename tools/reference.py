@@ -95,14 +95,14 @@ class ExampleError(Exception):
 
 
 def examples(path):
-    """The parts of an example file: title, source, output, figures as SVG."""
+    """The parts of an example file, what stands before the first one included: title, source,
+    output, figures as SVG."""
     from qx import report
     plt = report._pyplot()
     pieces = re.split(r"^#%% *(.*)\n", path.read_text("utf-8"), flags=re.MULTILINE)
     names = {"__name__": "example"}
-    exec(compile(pieces[0], str(path), "exec"), names)
-    line = pieces[0].count("\n") + 1
-    for title, source in zip(pieces[1::2], pieces[2::2]):
+    line = 0
+    for title, source in zip(["", *pieces[1::2]], pieces[::2]):
         output = io.StringIO()
         try:
             with contextlib.redirect_stdout(output):
@@ -115,9 +115,10 @@ def examples(path):
 
 
 def examples_text(path):
-    out = ["<h2>Examples</h2><pre>import numpy as np\nimport qx</pre>"]
+    out = ["<h2>Examples</h2>"]
     for title, source, output, figures in examples(path):
-        out.append(f"<h3>{html.escape(title)}</h3>")
+        if title:
+            out.append(f"<h3>{html.escape(title)}</h3>")
         shown = re.sub(r"^.*# hidden\n?", "", source, flags=re.MULTILINE)
         out.append(f"<pre>{html.escape(shown)}</pre>")
         if output:
