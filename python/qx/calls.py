@@ -98,7 +98,8 @@ class Export:
         self.has_error = bool(self.arguments) and self.arguments[-1]["kind"] == "error"
         self.has_plan = any(a["kind"] in ("slot", "instance") for a in self.arguments)
         self.names = [a["name"] + "_" * keyword.iskeyword(a["name"]) for a in self.given]
-        self.gives_value = entry["returns"] not in ("ErrorCode", "void") and not self.has_error
+        self.gives_value = not self.taken and not self.has_error and (
+            entry["returns"] not in ("ErrorCode", "void"))
         self.is_scalar = bool(self.given) and all(
             a["kind"] in ("value", "reference", "output", "error") for a in self.arguments) and all(
             a["element"] in C_TYPES for a in self.arguments if a["kind"] == "value")
@@ -221,7 +222,7 @@ class Export:
             for value, a in zip(values, self.given)])
         shape, n = spread[0].shape, spread[0].size
         spread = iter(spread)
-        columns, results, codes = [], [], None
+        columns, kept, results, codes = [], [], [], None
         for argument in self.arguments:
             dtype = arrays.element_dtype(argument["element"])
             if self._is_given(argument):
@@ -235,6 +236,7 @@ class Export:
                 codes = data
             elif argument["direction"] == "out":
                 results.append(data.reshape(shape))
+            kept.append(data)  # only its address goes into the calls
             start = data.ctypes.data
             columns.append(range(start, start + n * dtype.itemsize, dtype.itemsize))
         returned = [self.function(*row) for row in zip(*columns)]
@@ -243,7 +245,7 @@ class Export:
         if codes is not None:
             self._check_mapped(codes)
         if self.gives_value:
-            results = [np.array(returned, None if n else float).reshape(shape), *results]
+            return np.array(returned, None if n else float).reshape(shape)
         return results[0] if len(results) == 1 else tuple(results)
 
     def _check_mapped(self, codes):

@@ -162,15 +162,26 @@ class Plans(unittest.TestCase):
         np.testing.assert_array_equal(first[1], second[1])
 
 
-@unittest.skipUnless("QX_BesselJr" in qx.names(), "no function of scalars yet")
 class Scalars(unittest.TestCase):
     def test_functions_of_scalars_map_over_arrays(self):
+        t = np.array([[-1.0, 0.0], [1.0, 6.5]])
+        found = qx.call("TDist_head", t, 1)  # one degree of freedom: Cauchy's distribution
+        np.testing.assert_allclose(found, 0.5 + np.arctan(t) / np.pi, rtol=1e-9)
+        self.assertEqual(qx.call("TDist_head", 6.5, 1), found[1, 1])
+        self.assertEqual(qx.call("TDist_head", [], 1).shape, (0,))
+        self.assertEqual(qx.call("TDist_head", t[:, :1], [1, 2, 3]).shape, (2, 3))
+        self.assertRaises(TypeError, qx.call, "TDist_head", t * 1j, 1)
+        self.assertRaises(TypeError, qx.call, "TDist_head", t, [1.5])
+        with self.assertRaisesRegex(qx.QxError, "at element 2") as caught:
+            qx.call("TDist_head", 1.0, [1, 2, 0, -1])
+        self.assertLess(caught.exception.code, 0)
+        self.assertEqual(qx.call("NormDist_head", [-np.inf, np.inf]).tolist(), [0.0, 1.0])
+
+    @unittest.skipUnless("QX_BesselJr" in qx.names(), "not in this build")
+    def test_several_results_and_values(self):
         x = np.array([[0.5, 1.0], [2.0, 40.0]])
-        found = qx.call("QX_BesselJr", 0.5, x)
-        np.testing.assert_allclose(found, np.sqrt(2 / (np.pi * x)) * np.sin(x), rtol=1e-12)
-        self.assertEqual(qx.call("QX_BesselJr", 0.5, 2.0), found[1, 0])
-        self.assertEqual(qx.call("QX_BesselJr", 0.5, []).shape, (0,))
-        self.assertRaises(TypeError, qx.call, "QX_BesselJr", 0.5, x * 1j)
+        np.testing.assert_allclose(qx.call("QX_BesselJr", 0.5, x),
+                                   np.sqrt(2 / (np.pi * x)) * np.sin(x), rtol=1e-12)
         orders = qx.call("QX_BesselJs", np.arange(4)[:, np.newaxis], x[0])
         self.assertEqual(orders.shape, (4, 2))
         np.testing.assert_allclose(orders[0], np.sin(x[0]) / x[0], rtol=1e-12)
