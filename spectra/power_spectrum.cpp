@@ -38,9 +38,9 @@ ErrorCode PowerSpectrumReal(DBL *x, int32_t n) {
     if (!plan)
         return ErrOutOfMemory;
     DBL *const h = work.data();
+    const double s = SpectrumScale(n);
     if (const ErrorCode failed = FFTRealForward(plan.get(), x, h, 1, 1, n))
         return failed;
-    const double s = SpectrumScale(n);
     x[0] = (h[0] * h[0]) * s;
     const std::ptrdiff_t last = (n - 1) / 2;
     std::ptrdiff_t k = 1;
