@@ -1,0 +1,1 @@
+qx_bench(windows SOURCES windows.cpp)
