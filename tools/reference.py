@@ -4,8 +4,9 @@
     reference.py --library BUILD_DIR --output FOLDER
 
 Declarations and documentation come from the catalogue. The examples are the Python files in
-examples/reference, one per family, cut at lines "#%% title"; each part is shown with what it
-prints and plots. An example that fails ends the run.
+examples/reference, cut at lines "#%% title"; each part is shown with what it prints and plots. A
+file stands on the page of the family of the first export that it calls. An example that fails ends
+the run.
 """
 
 import argparse
@@ -114,6 +115,15 @@ def examples(path):
         line += source.count("\n") + 1
 
 
+def examples_of(family, catalogue):
+    """The example files of a family."""
+    families = {entry["name"]: entry["family"] for entry in catalogue["exports"]}
+    for path in sorted((ROOT / "examples" / "reference").glob("*.py")):
+        called = re.search(r'qx\.call\(\s*"(\w+)"', path.read_text("utf-8"))
+        if called and families.get(called.group(1)) == family:
+            yield path
+
+
 def examples_text(path):
     out = ["<h2>Examples</h2>"]
     for title, source, output, figures in examples(path):
@@ -135,6 +145,7 @@ def write(output):
     output.mkdir(parents=True, exist_ok=True)
     index = ["<p>Every export of the module, by family. <code>python3 -m qx show NAME</code> tells "
              "the same on the terminal.</p>"]
+    shown = set()
     for family in catalogue["families"]:
         entries = [e for e in catalogue["exports"] if e["family"] == family["name"]]
         if not entries:
@@ -143,15 +154,18 @@ def write(output):
         links = "".join(f'<li><a href="{name}.html#{e["name"]}">{e["name"]}</a></li>' for e in entries)
         body = [f"<p>Header <code>{family['header']}</code></p>", prose(family["introduction"]),
                 f'<ul class="index">{links}</ul>']
-        example = ROOT / "examples" / "reference" / f"{name}.py"
-        if example.exists():
-            body.append(examples_text(example))
+        for path in examples_of(name, catalogue):
+            shown.add(path.name)
+            body.append(examples_text(path))
         body.append("<h2>Exports</h2>")
         body += [export_text(e, catalogue, lib, export(e["name"]).signature()) for e in entries]
         (output / f"{name}.html").write_text(page(name, "".join(body)), "utf-8")
         first = re.split(r"(?<=\.)\s", " ".join(family["introduction"].split()))[0]
         index.append(f'<h2><a href="{name}.html">{name}</a></h2><p>{marked(first)}</p>'
                      f'<ul class="index">{links}</ul>')
+    for path in sorted((ROOT / "examples" / "reference").glob("*.py")):
+        if path.name not in shown:
+            print(f"not shown: {path}, whose first export is not in this build")
     (output / "index.html").write_text(page("Reference", "".join(index), up=False), "utf-8")
 
 
