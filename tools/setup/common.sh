@@ -1,10 +1,11 @@
+# shellcheck shell=bash
 # Shared by the set-up scripts; sourced, not run. Defines CACHE and:
 #   note TEXT...                a line of progress, on standard error
 #   fail TEXT...                says what is wrong and ends the script
 #   need_commands "PACKAGE..." COMMAND...   installs the packages where a command is missing
 #   debian_source PACKAGE       prints the folder of the unpacked Debian source package
 
-CACHE=${QX_CACHE:-${XDG_CACHE_HOME:-$HOME/.cache}/qxanalysis}
+CACHE=${QX_CACHE:-${XDG_CACHE_HOME:-${HOME:-/root}/.cache}/qxanalysis}
 mkdir -p "$CACHE"
 
 note() { echo "[$(basename "$0")] $*" >&2; }
