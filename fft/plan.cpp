@@ -26,13 +26,15 @@ FFTPlan *Acquire(int32_t length);
 void Release(FFTPlan *plan);
 
 // A table from the heap, for a plan outlives the workspace. Sizes that int32 cannot count are
-// refused on every target alike.
+// refused on every target alike; an empty table takes no memory and stays null.
 template <class T>
 bool Allocate(T *&table, int64_t count) {
+    if (count == 0)
+        return true;
     if (count * int64_t{sizeof(T)} > std::numeric_limits<int32_t>::max())
         return false;
     table = static_cast<T *>(std::malloc(static_cast<std::size_t>(count) * sizeof(T)));
-    return table != nullptr || count == 0;
+    return table != nullptr;
 }
 
 void Append(FFTPlan *plan, int32_t factor, int32_t kind) {
