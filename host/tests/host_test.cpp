@@ -1,3 +1,4 @@
+#include "qx/fft.h"
 #include "qx/frame.h"
 #include "qx/host.hpp"
 
@@ -186,6 +187,29 @@ TEST(Module, BindsToTheStandInHost) {
     EXPECT_EQ(status.code, 0);
     EnableAnalysisWorkspaceH(&status);
     EXPECT_EQ(status.code, ErrWorkspaceNotInitialized);
+}
+
+// No export releases the plan behind a slot; the module's own clean-up procedure does.
+TEST(Module, GivesBackThePlansOfSlotsAndInstances) {
+    const Array1D<double> x{1, 2, 3, 4};
+    const Array1D<std::complex<double>> spectrum;
+    {
+        qx::host::Slot plan;
+        qx::host::Instance node(TransformUnreserveProc);
+        for (int call = 0; call < 2; ++call) {
+            qx::host::check(ReOXFFTH80(x.handle(), spectrum.handle(), plan.address(), 0, 4, 0));
+            EXPECT_EQ(spectrum[0], 10.0);
+            qx::host::check(ReOXFFTH80_IDP(x.handle(), spectrum.handle(), node.address(), 0, 4, 0));
+            EXPECT_EQ(spectrum[1], std::complex<double>(-2, 2));
+        }
+        EXPECT_NE(*plan.address(), nullptr);
+        EXPECT_NE(*node.address(), nullptr);
+        plan.release();
+        EXPECT_EQ(*plan.address(), nullptr);
+        qx::host::check(ReOXFFTH80(x.handle(), spectrum.handle(), plan.address(), 0, 4, 0));
+    }
+    // Only the workspace's procedure, registered for the process, is left.
+    EXPECT_LE(QXHostRunSweeps(), 1);
 }
 
 TEST(Texts, AreThereForUnknownCodesToo) {
