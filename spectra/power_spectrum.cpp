@@ -68,13 +68,12 @@ ErrorCode PowerSpectrumComplex(const DBL *z, DBL *out, int32_t n) {
     const PlanReference plan(n);
     if (!plan)
         return ErrOutOfMemory;
-    DBL *const re = work.data();
-    DBL *const im = re + n;
-    if (const ErrorCode failed = FFTComplexForward(plan.get(), z, z + 1, re, im, 2, 1, n))
+    DBL *const f = work.data();
+    if (const ErrorCode failed = FFTComplexForward(plan.get(), z, z + 1, f, f + 1, 2, 2, n))
         return failed;
     const double s = SpectrumScale(n);
     for (std::ptrdiff_t k = 0; k < n; ++k)
-        out[k] = (re[k] * re[k] + im[k] * im[k]) * s;
+        out[k] = (f[2 * k] * f[2 * k] + f[2 * k + 1] * f[2 * k + 1]) * s;
     return work.release();
 }
 
@@ -137,18 +136,21 @@ ErrorCode CrossSpectrumComplex(const DBL *x, const DBL *y, int32_t n, DBL *out) 
     const PlanReference plan(n);
     if (!plan)
         return ErrOutOfMemory;
-    DBL *const xRe = work.data();
-    DBL *const xIm = xRe + n;
-    DBL *const yRe = xIm + n;
-    DBL *const yIm = yRe + n;
-    if (const ErrorCode failed = FFTComplexForward(plan.get(), x, x + 1, xRe, xIm, 2, 1, n))
+    DBL *const first = work.data();
+    DBL *const second = first + 2 * std::ptrdiff_t{n};
+    if (const ErrorCode failed = FFTComplexForward(plan.get(), x, x + 1, first, first + 1, 2, 2, n))
         return failed;
-    if (const ErrorCode failed = FFTComplexForward(plan.get(), y, y + 1, yRe, yIm, 2, 1, n))
+    if (const ErrorCode failed =
+            FFTComplexForward(plan.get(), y, y + 1, second, second + 1, 2, 2, n))
         return failed;
     const double s = SpectrumScale(n);
     for (std::ptrdiff_t k = 0; k < n; ++k) {
-        out[2 * k] = (xRe[k] * yRe[k] + yIm[k] * xIm[k]) * s;
-        out[2 * k + 1] = (xRe[k] * yIm[k] - yRe[k] * xIm[k]) * s;
+        const double xRe = first[2 * k];
+        const double xIm = first[2 * k + 1];
+        const double yRe = second[2 * k];
+        const double yIm = second[2 * k + 1];
+        out[2 * k] = (xRe * yRe + yIm * xIm) * s;
+        out[2 * k + 1] = (xRe * yIm - yRe * xIm) * s;
     }
     return work.release();
 }

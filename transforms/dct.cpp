@@ -71,28 +71,24 @@ ErrorCode InverseEven(const DBL *spectrum, std::ptrdiff_t inStride, DBL *out,
     const DBL *const wave = QuarterWave(plan);
     if (!wave)
         return ErrOutOfMemory;
-    const std::ptrdiff_t length = n;
-    DBL *const re = work;
-    DBL *const im = work + length;
-    DBL *const u = work + 2 * length;
+    // Interleaved, which the engine transforms fastest.
+    CDB *const z = reinterpret_cast<CDB *>(work);
+    CDB *const u = z + n;
     const double scale = std::sqrt(2.0 * n);
-    re[0] = spectrum[0] * std::sqrt(static_cast<double>(n));
-    im[0] = 0;
+    z[0] = CDB{spectrum[0] * std::sqrt(static_cast<double>(n)), 0};
     for (std::ptrdiff_t k = 1; k <= n / 2; ++k) {
         const double c = wave[2 * k] * scale;
         const double s = wave[2 * k + 1] * scale;
         const double low = spectrum[k * inStride];
         const double high = spectrum[(n - k) * inStride];
-        re[k] = low * c;
-        im[k] = low * s;
-        re[n - k] = high * s;
-        im[n - k] = high * c;
+        z[k] = CDB{low * c, low * s};
+        z[n - k] = CDB{high * s, high * c};
     }
-    if (const ErrorCode failed = FFTComplexInverse(plan, re, im, u, u + length, 1, 1, n))
+    if (const ErrorCode failed = FFTComplexInverse(plan, &z->re, &z->im, &u->re, &u->im, 2, 2, n))
         return failed;
     for (std::ptrdiff_t j = 0; j < n / 2; ++j) {
-        out[2 * j * outStride] = u[j];
-        out[(2 * j + 1) * outStride] = u[n - 1 - j];
+        out[2 * j * outStride] = u[j].re;
+        out[(2 * j + 1) * outStride] = u[n - 1 - j].re;
     }
     return 0;
 }

@@ -314,15 +314,18 @@ TEST(OneDimensional, EveryFailedAllocationEndsCleanly) {
     for (bool isReal : {false, true})
         for (bool isInstance : {false, true}) {
             int32_t failAt = 1;
-            for (ErrorCode status = -1; status != 0; ++failAt) {
+            for (bool failed = true; failed; ++failAt) {
                 CDBArray out(1);
                 const HeapProbe probe(failAt);
                 {
                     Node node;
-                    status = run(isReal, isInstance, node, out);
-                    const bool failed = probe.allocations() >= failAt;
-                    EXPECT_EQ(status, failed ? ErrOutOfMemory : 0);
-                    EXPECT_EQ(out.size(), failed ? 0 : 10);
+                    ErrorCode status = run(isReal, isInstance, node, out);
+                    failed = probe.allocations() >= failAt;
+                    // An engine that can do without some table goes on.
+                    const bool refused = status != 0;
+                    EXPECT_LE(refused, failed);
+                    EXPECT_EQ(status, refused ? ErrOutOfMemory : 0);
+                    EXPECT_EQ(out.size(), refused ? 0 : 10);
                 }
                 EXPECT_EQ(probe.liveAllocations(), 0) << failAt;
             }

@@ -218,15 +218,18 @@ TEST(TwoDimensional, EveryFailedAllocationEndsCleanly) {
     };
     const auto failEach = [](auto run) {
         int32_t failAt = 1;
-        for (ErrorCode status = -1; status != 0; ++failAt) {
+        for (bool failed = true; failed; ++failAt) {
             CDBMatrix out(1, 1);
             const HeapProbe probe(failAt);
             {
                 Node node;
-                status = run(node, out);
-                const bool failed = probe.allocations() >= failAt;
-                EXPECT_EQ(status, failed ? ErrOutOfMemory : 0);
-                EXPECT_EQ(out.rows() == 0, failed);
+                ErrorCode status = run(node, out);
+                failed = probe.allocations() >= failAt;
+                // An engine that can do without some table goes on.
+                const bool refused = status != 0;
+                EXPECT_LE(refused, failed);
+                EXPECT_EQ(status, refused ? ErrOutOfMemory : 0);
+                EXPECT_EQ(out.rows() == 0, refused);
             }
             EXPECT_EQ(probe.liveAllocations(), 0) << failAt;
         }

@@ -174,15 +174,18 @@ TEST(Spectra, EveryFailedAllocationEndsCleanly) {
     const CDBArray z(RandomComplex(6));
     const auto failEach = [](auto run) {
         int32_t failAt = 1;
-        for (ErrorCode status = -1; status != 0; ++failAt) {
+        for (bool failed = true; failed; ++failAt) {
             const HeapProbe probe(failAt);
             {
                 Node node;
                 int32_t size = 0;
-                status = run(node, size);
-                const bool failed = probe.allocations() >= failAt;
-                EXPECT_EQ(status, failed ? ErrOutOfMemory : 0);
-                EXPECT_EQ(size, failed ? 0 : 6);
+                ErrorCode status = run(node, size);
+                failed = probe.allocations() >= failAt;
+                // An engine that can do without some table goes on.
+                const bool refused = status != 0;
+                EXPECT_LE(refused, failed);
+                EXPECT_EQ(status, refused ? ErrOutOfMemory : 0);
+                EXPECT_EQ(size, refused ? 0 : 6);
             }
             EXPECT_EQ(probe.liveAllocations(), 0) << failAt;
         }

@@ -139,17 +139,20 @@ TEST(BandTransform, EveryFailedAllocationEndsCleanly) {
     const CDBArray x(RandomComplex(6));
     for (bool isInstance : {false, true}) {
         int32_t failAt = 1;
-        for (ErrorCode status = -1; status != 0; ++failAt) {
+        for (bool failed = true; failed; ++failAt) {
             CDBArray out(1);
             const HeapProbe probe(failAt);
             {
                 Node node;
-                status = isInstance
-                             ? CxDZTH_IDP(x.handle(), 2, 3, 0, 4, out.handle(), &node.instance)
-                             : CxDZTH(x.handle(), 2, 3, 0, 4, out.handle(), &node.slot);
-                const bool failed = probe.allocations() >= failAt;
-                EXPECT_EQ(status, failed ? ErrOutOfMemory : 0);
-                EXPECT_EQ(out.size(), failed ? 0 : 4);
+                ErrorCode status =
+                    isInstance ? CxDZTH_IDP(x.handle(), 2, 3, 0, 4, out.handle(), &node.instance)
+                               : CxDZTH(x.handle(), 2, 3, 0, 4, out.handle(), &node.slot);
+                failed = probe.allocations() >= failAt;
+                // An engine that can do without some table goes on.
+                const bool refused = status != 0;
+                EXPECT_LE(refused, failed);
+                EXPECT_EQ(status, refused ? ErrOutOfMemory : 0);
+                EXPECT_EQ(out.size(), refused ? 0 : 4);
             }
             EXPECT_EQ(probe.liveAllocations(), 0) << failAt;
         }

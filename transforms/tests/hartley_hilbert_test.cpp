@@ -116,16 +116,19 @@ TEST(HartleyHilbert, EveryFailedAllocationEndsCleanly) {
     const Signal values = RandomSignal(6);
     for (InSlot run : {FHTH, InvFHTH, FastHilbertTransformH, InvFastHilbertTransformH}) {
         int32_t failAt = 1;
-        for (ErrorCode status = -1; status != 0; ++failAt) {
+        for (bool failed = true; failed; ++failAt) {
             const DBLArray x(values);
             const HeapProbe probe(failAt);
             {
                 Node node;
-                status = run(x.handle(), &node.slot);
-                const bool failed = probe.allocations() >= failAt;
-                EXPECT_EQ(status, failed ? ErrOutOfMemory : 0);
-                const bool untouched = run == InvFHTH && failed && node.slot == nullptr;
-                EXPECT_EQ(x.size(), failed && !untouched ? 0 : 6);
+                ErrorCode status = run(x.handle(), &node.slot);
+                failed = probe.allocations() >= failAt;
+                // An engine that can do without some table goes on.
+                const bool refused = status != 0;
+                EXPECT_LE(refused, failed);
+                EXPECT_EQ(status, refused ? ErrOutOfMemory : 0);
+                const bool untouched = run == InvFHTH && refused && node.slot == nullptr;
+                EXPECT_EQ(x.size(), refused && !untouched ? 0 : 6);
                 if (untouched) {
                     EXPECT_TRUE(SameBits(x.values(), values));
                 }
