@@ -65,7 +65,9 @@ void Factorise(FFTPlan *plan) {
 }
 
 // The powers of exp(-i theta) from the first up: each from the one before by a recurrence whose
-// error stays small because 1 - cos(theta), formed without cancellation, is small.
+// error stays small because 1 - cos(theta), formed without cancellation, is small. What a rounding
+// takes from one power is handed on to the next, as in Kahan's summation (1965); without that the
+// errors of a hundred thousand steps add up to a hundred times that of one.
 class Roots {
 public:
     explicit Roots(double theta) : s_(-std::sin(theta)) {
@@ -73,18 +75,25 @@ public:
         c_ = 2.0 * half * half;
         re = 1.0 - c_;
         im = s_;
+        reRest_ = (1.0 - re) - c_;
     }
     void advance() {
-        const double oldRe = re;
-        const double oldIm = im;
-        re = oldRe - (oldRe * c_ + oldIm * s_);
-        im = oldIm - (oldIm * c_ - oldRe * s_);
+        const double reStep = reRest_ - (re * c_ + im * s_);
+        const double imStep = imRest_ - (im * c_ - re * s_);
+        const double newRe = re + reStep;
+        const double newIm = im + imStep;
+        reRest_ = reStep - (newRe - re);
+        imRest_ = imStep - (newIm - im);
+        re = newRe;
+        im = newIm;
     }
 
     double re, im;
 
 private:
     double c_, s_;
+    double reRest_;
+    double imRest_ = 0.0;
 };
 
 bool BuildTwiddles(FFTStage *stage, int32_t p, int32_t n) {
