@@ -8,6 +8,7 @@
 #include "qx/errors.h"
 #include "qx/fft.h"
 #include "qx/frame.h"
+#include "qx/special.h"
 #include "qx/spectra.h"
 #include "qx/stats.h"
 #include "qx/transforms.h"

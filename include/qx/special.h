@@ -1,0 +1,9 @@
+#ifndef QX_SPECIAL_H
+#define QX_SPECIAL_H
+
+/* The real special functions: one value at a time, no status; NaN or an infinity is their only
+   sign of a fault. */
+
+#include "qx/special_bessel.h"
+
+#endif

@@ -1,0 +1,297 @@
+#include "special/bessel_integer.h"
+
+#include "special/bessel_uniform.h"
+#include "special/extended.h"
+#include "special/reciprocal_gamma.h"
+#include "special/tables/bessel.h"
+
+#include <cmath>
+#include <limits>
+
+namespace qx {
+
+namespace {
+
+constexpr double kInfinity = std::numeric_limits<double>::infinity();
+constexpr double kNaN = std::numeric_limits<double>::quiet_NaN();
+constexpr double kTwoOverPi = 0.6366197723675814;
+constexpr double kInvSqrtPi = 0.5641895835477563;
+constexpr double kSmall = 8;
+constexpr double kFar = 20;
+constexpr double kUniformFrom = 200;
+constexpr double kTiny = 1e-8; // x^2 / 4 is below half an ulp of 1
+
+// x - zero, with the zero's square in two doubles: (x^2 - zero^2) keeps its digits near the zero.
+double FromZero(Extended square, const double (&zero)[2]) {
+    return (square.high - zero[0]) + (square.low - zero[1]);
+}
+
+struct Wave {
+    double j, y;
+};
+
+// Modulus and phase for x >= 8: the phase x - (2 n + 1) pi / 4 is never formed, its sine and
+// cosine are sums of those of x.
+Wave Wave0(double x) {
+    const double z = 1 / (x * x);
+    const bool far = x >= kFar;
+    const double p = far ? table::j0PhaseFarCos(z) : table::j0PhaseMidCos(z);
+    const double q = (far ? table::j0PhaseFarSin(z) : table::j0PhaseMidSin(z)) / x;
+    const double s = std::sin(x);
+    const double c = std::cos(x);
+    const double scale = kInvSqrtPi / std::sqrt(x);
+    return {scale * ((c + s) * p - (s - c) * q), scale * ((s - c) * p + (c + s) * q)};
+}
+
+Wave Wave1(double x) {
+    const double z = 1 / (x * x);
+    const bool far = x >= kFar;
+    const double p = far ? table::j1PhaseFarCos(z) : table::j1PhaseMidCos(z);
+    const double q = (far ? table::j1PhaseFarSin(z) : table::j1PhaseMidSin(z)) / x;
+    const double s = std::sin(x);
+    const double c = std::cos(x);
+    const double scale = kInvSqrtPi / std::sqrt(x);
+    return {scale * ((s - c) * p + (c + s) * q), scale * ((s - c) * q - (c + s) * p)};
+}
+
+double I0Scaled(double x) { // x >= 8: sqrt(x) exp(-x) I0(x)
+    return x < 24 ? table::i0Mid(1 / x) : table::i0Far(1 / x);
+}
+double I1Scaled(double x) {
+    return x < 24 ? table::i1Mid(1 / x) : table::i1Far(1 / x);
+}
+
+double I0(double x) {
+    if (x < kTiny)
+        return 1;
+    if (x <= kSmall)
+        return table::i0Small(x * x);
+    const double half = std::exp(0.5 * x); // exp(x) would overflow before I0 does
+    return half * (half * I0Scaled(x) / std::sqrt(x));
+}
+
+double I1(double x) {
+    if (x <= kSmall)
+        return x * table::i1Small(x * x);
+    const double half = std::exp(0.5 * x);
+    return half * (half * I1Scaled(x) / std::sqrt(x));
+}
+
+// exp(x) K0(x) and exp(x) K1(x).
+struct ScaledK {
+    double k0, k1;
+};
+
+ScaledK KScaled(double x) {
+    if (x <= 1) {
+        const double e = std::exp(x);
+        const double l = std::log(x);
+        const double z = x * x;
+        return {e * (table::k0Small(z) - l * I0(x)), e * (1 / x + (x * table::k1Small(z) + l * I1(x)))};
+    }
+    const double u = 1 / x;
+    const double root = std::sqrt(x);
+    if (x < 5)
+        return {table::k0Mid(u) / root, table::k1Mid(u) / root};
+    return {table::k0Far(u) / root, table::k1Far(u) / root};
+}
+
+// J_n / J_{n-1} for n > x by its continued fraction, modified Lentz's method
+// (W. J. Lentz, Applied Optics 15, 1976). For n > x a few dozen terms serve; near n = x they grow
+// as the cube root of n.
+double RatioOfJ(double n, double x) {
+    constexpr double tiny = 1e-300;
+    constexpr double eps = 1.1102230246251565e-16;
+    double b = 2 * n / x;
+    double f = b;
+    double c = b;
+    double d = 0;
+    for (int i = 1; i < 2000; ++i) {
+        b = 2 * (n + i) / x;
+        d = b - d;
+        c = b - 1 / c;
+        if (d == 0)
+            d = tiny;
+        if (c == 0)
+            c = tiny;
+        d = 1 / d;
+        const double factor = c * d;
+        f *= factor;
+        if (std::fabs(factor - 1) <= eps)
+            break;
+    }
+    return 1 / f;
+}
+
+} // namespace
+
+double BesselJ0(double x) {
+    if (std::isinf(x))
+        return 0;
+    if (x < kTiny)
+        return 1;
+    if (x >= kSmall)
+        return Wave0(x).j;
+    const Extended z = ExactProduct(x, x);
+    return FromZero(z, table::j0Zero1Squared) * FromZero(z, table::j0Zero2Squared) *
+           table::j0Small(z.high);
+}
+
+double BesselJ1(double x) {
+    if (std::isinf(x))
+        return 0;
+    if (x < kTiny)
+        return 0.5 * x;
+    if (x >= kSmall)
+        return Wave1(x).j;
+    const Extended z = ExactProduct(x, x);
+    return x * FromZero(z, table::j1Zero1Squared) * FromZero(z, table::j1Zero2Squared) *
+           table::j1Small(z.high);
+}
+
+double BesselY0(double x) {
+    if (std::isinf(x))
+        return 0;
+    if (x >= kSmall)
+        return Wave0(x).y;
+    return (table::y0Low(x * x) - 2) + kTwoOverPi * std::log(x) * BesselJ0(x);
+}
+
+double BesselY1(double x) {
+    if (std::isinf(x))
+        return 0;
+    if (x >= kSmall)
+        return Wave1(x).y;
+    return x * (table::y1Low(x * x) - 2) + kTwoOverPi * (std::log(x) * BesselJ1(x) - 1 / x);
+}
+
+double BesselJn(double n, double x) {
+    if (std::isinf(x))
+        return 0;
+    if (n == 0)
+        return BesselJ0(x);
+    if (n == 1)
+        return BesselJ1(x);
+    if (x == 0)
+        return 0;
+    if (n >= kUniformFrom)
+        return BesselLargeOrder(n, x).j;
+    if (n <= x) {
+        double before = BesselJ0(x);
+        double value = BesselJ1(x);
+        for (double k = 1; k < n; k += 1) {
+            const double next = 2 * k / x * value - before;
+            before = value;
+            value = next;
+        }
+        return value;
+    }
+    if (x * x < n + 1) { // the ascending series falls from its first term on
+        const double quarter = -0.25 * x * x;
+        double term = 1;
+        double sum = 1;
+        for (double k = 1; k < 60 && std::fabs(term) > 1e-17; k += 1) {
+            term *= quarter / (k * (n + k));
+            sum += term;
+        }
+        return PowerOverGamma(0.5 * x, n) * sum;
+    }
+    // downward, from J_n = r and J_{n-1} = 1
+    double above = RatioOfJ(n, x);
+    const double start = above;
+    double value = 1;
+    for (double k = n - 1; k > 0; k -= 1) {
+        const double below = 2 * k / x * value - above;
+        above = value;
+        value = below;
+    }
+    return std::fabs(value) > std::fabs(above) ? start / value * BesselJ0(x)
+                                               : start / above * BesselJ1(x);
+}
+
+double BesselYn(double n, double x) {
+    if (std::isinf(x))
+        return 0;
+    if (x == 0)
+        return -kInfinity;
+    if (n == 0)
+        return BesselY0(x);
+    if (n == 1)
+        return BesselY1(x);
+    if (n >= kUniformFrom)
+        return BesselLargeOrder(n, x).y;
+    double before = BesselY0(x);
+    double value = BesselY1(x);
+    for (double k = 1; k < n && std::isfinite(value); k += 1) {
+        const double next = 2 * k / x * value - before;
+        before = value;
+        value = next;
+    }
+    return std::isfinite(value) ? value : -kInfinity;
+}
+
+double BesselIn(double n, double x) {
+    if (n == 0)
+        return std::isinf(x) ? kInfinity : I0(x);
+    if (n == 1)
+        return std::isinf(x) ? kInfinity : I1(x);
+    if (x == 0)
+        return 0;
+    if (std::isinf(x))
+        return std::isinf(n) ? kNaN : kInfinity;
+    if (n >= kModifiedUniformFrom)
+        return ModifiedBesselLargeOrder(n, x).i;
+    if (x > 800)
+        return kInfinity;
+    if (0.25 * x * x < 10 * (n + 1)) {
+        const double quarter = 0.25 * x * x;
+        double term = 1;
+        double sum = 1;
+        for (double k = 1; k < 200 && term > 1e-17 * sum; k += 1) {
+            term *= quarter / (k * (n + k));
+            sum += term;
+        }
+        return PowerOverGamma(0.5 * x, n) * sum;
+    }
+    // Downward from an order where I has fallen by 1e-17 relative to I_n; the trial values are
+    // positive, so the recurrence is stable, and they cannot overflow: they grow by I0 / I_start.
+    const double start = n + std::ceil(std::sqrt(80 * (n + x))) * 0.5 + 20;
+    double above = 0;
+    double value = 1e-290;
+    double wanted = 0;
+    for (double k = std::floor(start); k > 0; k -= 1) {
+        const double below = 2 * k / x * value + above;
+        above = value;
+        value = below;
+        if (k - 1 == n)
+            wanted = value;
+    }
+    return wanted / value * I0(x);
+}
+
+double BesselKn(double n, double x) {
+    if (std::isnan(x))
+        return x;
+    if (x < 0)
+        return kNaN;
+    if (x == 0)
+        return kInfinity;
+    if (std::isinf(x))
+        return 0;
+    if (n > 1000) // the recurrence would serve, at a cost without bound
+        return ModifiedBesselLargeOrder(n, x).k;
+    const ScaledK scaled = KScaled(x);
+    const double half = std::exp(-0.5 * x);
+    if (n == 0)
+        return half * (scaled.k0 * half);
+    double before = scaled.k0;
+    double value = scaled.k1;
+    for (double k = 1; k < n && std::isfinite(value); k += 1) {
+        const double next = 2 * k / x * value + before;
+        before = value;
+        value = next;
+    }
+    return half * (value * half);
+}
+
+} // namespace qx

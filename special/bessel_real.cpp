@@ -1,0 +1,304 @@
+#include "special/bessel_real.h"
+
+#include "special/bessel_integer.h"
+#include "special/bessel_uniform.h"
+#include "special/extended.h"
+#include "special/reciprocal_gamma.h"
+
+#include <algorithm>
+#include <cmath>
+#include <limits>
+
+namespace qx {
+
+namespace {
+
+constexpr double kInfinity = std::numeric_limits<double>::infinity();
+constexpr double kNaN = std::numeric_limits<double>::quiet_NaN();
+constexpr double kEps = 2.220446049250313e-16;
+constexpr double kLowestOrder = -200;
+constexpr double kLargeOrder = 200;
+constexpr double kInt32 = 2147483647;
+constexpr double kTwoOverPi = 0.6366197723675814;
+constexpr int kMostTerms = 1000;
+
+// The sum of q^k / (k! (order + 1)_k), q = -x^2/4 or x^2/4, in two doubles: terms of both signs
+// may exceed the sum by many orders of magnitude.
+double CarefulSum(double order, Extended q) {
+    Extended term = {1, 0};
+    Extended sum = term;
+    for (int k = 1; k < kMostTerms; ++k) {
+        const Extended divisor = Extended{static_cast<double>(k), 0} * ExactSum(order, k);
+        term = term * q / divisor;
+        sum = sum + term;
+        if (std::fabs(term.high) <= 1e-18 * std::fabs(sum.high) && k + order > 0 &&
+            std::fabs(q.high) < std::fabs(divisor.high))
+            break;
+    }
+    return sum.high;
+}
+
+// The same where the terms fall from the first or have one sign.
+double PlainSum(double order, double q) {
+    double term = 1;
+    double sum = 1;
+    for (int k = 1; k < kMostTerms; ++k) {
+        term *= q / (k * (order + k));
+        sum += term;
+        if (std::fabs(term) <= 1e-17 * std::fabs(sum))
+            break;
+    }
+    return sum;
+}
+
+// Ascending series of J.
+double BesselJSeries(double order, double x) {
+    const double q = -0.25 * x * x;
+    const double factor = PowerOverGamma(0.5 * x, order);
+    if (factor == 0 || std::isinf(factor))
+        return factor;
+    if (order > 0 && -q < 0.5 * (order + 1))
+        return factor * PlainSum(order, q);
+    const Extended square = ExactProduct(x, x);
+    return factor * CarefulSum(order, {-0.25 * square.high, -0.25 * square.low});
+}
+
+// The two sums of Hankel's form, cut at the smallest term.
+struct HankelSums {
+    double p, q;
+};
+
+HankelSums SumHankel(double order, double x, double sign) {
+    const double square = 4 * order * order;
+    double p = 1;
+    double q = 0;
+    double term = 1;
+    for (int k = 1; k < 200; ++k) {
+        const double odd = 2 * k - 1;
+        const double next = term * ((square - odd * odd) / (8 * k * x));
+        // terms grow at first where the order is large; they end when they grow past it
+        if (std::fabs(next) >= std::fabs(term) && odd * odd > square)
+            break;
+        term = next;
+        if (k % 2 != 0)
+            q += k % 4 == 1 ? term : sign * term;
+        else
+            p += k % 4 == 0 ? term : sign * term;
+        if (std::fabs(term) <= 0.25 * kEps)
+            break;
+    }
+    return {p, q};
+}
+
+OscillatingPair Hankel(double order, double x) {
+    const HankelSums sums = SumHankel(order, x, -1);
+    // the phase x - (order / 2 + 1 / 4) pi, each part reduced by itself
+    const double turn = 0.5 * order + 0.25;
+    const double st = SinPi(turn);
+    const double ct = CosPi(turn);
+    const double s = std::sin(x);
+    const double c = std::cos(x);
+    const double sine = s * ct - c * st;
+    const double cosine = c * ct + s * st;
+    const double scale = std::sqrt(kTwoOverPi / x);
+    return {scale * (cosine * sums.p - sine * sums.q), scale * (sine * sums.p + cosine * sums.q)};
+}
+
+double HankelFrom(double order) {
+    const double a = std::fabs(order);
+    return a < 26 ? (a * 0.0083 + 0.09) * a + 12.9 : 0.9 * a;
+}
+
+double UnshiftedJ(double order, double x) {
+    return x <= HankelFrom(order) ? BesselJSeries(order, x) : Hankel(order, x).j;
+}
+
+// J_order / J_(order-1), order > x > 0.
+double RatioAbove(double order, double x) {
+    double c = 2 * order / x;
+    double d = 0;
+    double f = c;
+    for (int i = 1; i < 2000; ++i) {
+        const double b = 2 * (order + i) / x;
+        d = 1 / (b - d);
+        c = b - 1 / c;
+        const double factor = c * d;
+        f *= factor;
+        if (std::fabs(factor - 1) <= 0.5 * kEps)
+            break;
+    }
+    return 1 / f;
+}
+
+// The recurrence away from order 0: `value` is J of order `from`, `next` of the order one step
+// further, step 1 or -1; the result is J of `order`. J_(m+1) + J_(m-1) = (2 m / x) J_m.
+double Recur(double order, double from, double step, double x, double value, double next) {
+    const int steps = static_cast<int>(std::lround(std::fabs(order - from)));
+    double mu = from + step;
+    for (int i = 0; i < steps; ++i) {
+        const double following = 2 * mu / x * next - value;
+        value = next;
+        next = following;
+        mu += step;
+    }
+    return value;
+}
+
+// An order that is higher than the shifted one and than x: downward from the continued fraction.
+double DownwardJ(double order, double from, double x) {
+    double above = RatioAbove(order, x);
+    const double start = above;
+    double value = 1; // of order - 1
+    const int steps = static_cast<int>(std::lround(order - 1 - from));
+    for (int i = 0; i < steps; ++i) {
+        const double below = 2 * (order - 1 - i) / x * value - above;
+        above = value;
+        value = below;
+    }
+    // compared with the larger of the two orders at the end, which is away from its zero
+    return std::fabs(value) > std::fabs(above) ? start / value * UnshiftedJ(from, x)
+                                               : start / above * UnshiftedJ(from + 1, x);
+}
+
+// The order near 3.6 sqrt(x) with the same fraction.
+double ShiftedOrder(double order, double x) {
+    const double a = std::fabs(order);
+    return std::floor(std::clamp(3.6 * std::sqrt(x), 2.0, 17.0)) + (a - std::floor(a));
+}
+
+// J for an order that is not an integer, not below -200, and x > 0.
+double NonIntegerJ(double order, double x) {
+    if (std::isinf(x))
+        return 0;
+    const double a = std::fabs(order);
+    if (a > 17 && x < 3.6 * std::sqrt(a))
+        return BesselJSeries(order, x);
+    if (a >= kLargeOrder)
+        return x / order / order <= 0.3 ? BesselLargeOrder(order, x).j : Hankel(order, x).j;
+    const double shifted = ShiftedOrder(order, x);
+    if (a <= shifted + 3)
+        return UnshiftedJ(order, x);
+    if (order < 0)
+        return Recur(order, -shifted, -1, x, UnshiftedJ(-shifted, x), UnshiftedJ(-shifted - 1, x));
+    if (order <= x)
+        return Recur(order, shifted, 1, x, UnshiftedJ(shifted, x), UnshiftedJ(shifted + 1, x));
+    return DownwardJ(order, shifted, x);
+}
+
+double NonIntegerY(double order, double x) {
+    if (std::isinf(x))
+        return 0;
+    if (order >= kLargeOrder)
+        return x / order / order <= 0.3 ? BesselLargeOrder(order, x).y : Hankel(order, x).y;
+    // Where J would come from Hankel's form, Y comes from the same sums without the difference.
+    const double shifted = ShiftedOrder(order, x);
+    if (order > 0 && x > HankelFrom(std::min(order, shifted + 1) + 3)) {
+        if (order <= shifted + 3)
+            return Hankel(order, x).y;
+        return Recur(order, shifted, 1, x, Hankel(shifted, x).y, Hankel(shifted + 1, x).y);
+    }
+    const double sine = SinPi(order);
+    const double cosine = CosPi(order);
+    const double second = NonIntegerJ(-order, x);
+    if (std::isinf(second))
+        return -second / sine;
+    return cosine == 0 ? -second / sine : (cosine * NonIntegerJ(order, x) - second) / sine;
+}
+
+// Orders above the range of int32 take the general way: there the expansion for large order.
+double IntegerJ(double n, double x) {
+    const double order = std::fabs(n);
+    const bool negative = IsOdd(order) && (n < 0) != (x < 0);
+    const double value = BesselJn(order, std::fabs(x));
+    return negative ? -value : value;
+}
+
+} // namespace
+
+double BesselJ(double order, double x) {
+    if (std::isnan(order) || std::isnan(x) || (order < kLowestOrder && !IsInteger(order)))
+        return kNaN;
+    if (std::isinf(order))
+        return 0;
+    if (IsInteger(order))
+        return IntegerJ(order, x);
+    if (x < 0)
+        return kNaN;
+    if (x < kEps)
+        return 0; // kept: also where the order is negative or below 1
+    return NonIntegerJ(order, x);
+}
+
+double BesselY(double order, double x) {
+    if (std::isnan(order) || !(x > 0) || order < kLowestOrder)
+        return kNaN;
+    if (std::isinf(order))
+        return -kInfinity;
+    if (IsInteger(order)) {
+        const double value = BesselYn(std::fabs(order), x);
+        return order < 0 && IsOdd(order) ? -value : value;
+    }
+    return NonIntegerY(order, x);
+}
+
+double SphericalBesselJ(int32_t n, double x) {
+    if (!(x >= 0))
+        return kNaN;
+    if (std::isinf(x))
+        return 0;
+    if (x == 0)
+        return n == 0 ? 1 : 0;
+    const double order = n + 0.5;
+    if (order < kLowestOrder)
+        return kNaN;
+    return std::sqrt(1.5707963267948966 / x) * NonIntegerJ(order, x);
+}
+
+double SphericalBesselY(int32_t n, double x) {
+    if (!(x >= 0))
+        return kNaN;
+    if (x == 0)
+        return -kInfinity;
+    if (std::isinf(x))
+        return 0;
+    return std::sqrt(1.5707963267948966 / x) * BesselY(n + 0.5, x);
+}
+
+double BesselI(double order, double x) {
+    if (std::isnan(order) || std::isnan(x))
+        return kNaN;
+    if (IsInteger(order)) {
+        const double value = BesselIn(std::fabs(order), std::fabs(x));
+        return x < 0 && IsOdd(order) ? -value : value;
+    }
+    if (x < 0 || order < kLowestOrder || (std::isinf(order) && std::isinf(x)))
+        return kNaN;
+    if (std::isinf(order))
+        return 0;
+    if (x == 0) {
+        if (order > 0)
+            return 0;
+        return IsOdd(std::floor(order)) ? kInfinity : -kInfinity;
+    }
+    const double a = std::fabs(order);
+    if (a >= kModifiedUniformFrom) {
+        const ModifiedPair pair = ModifiedBesselLargeOrder(a, x);
+        return order > 0 ? pair.i : pair.i + kTwoOverPi * SinPi(a) * pair.k;
+    }
+    if (x > 1000)
+        return kInfinity;
+    if (x >= 40 && x >= 0.5 * a * a) {
+        const HankelSums sums = SumHankel(order, x, 1);
+        const double half = std::exp(0.5 * x);
+        return half * (half * ((sums.p - sums.q) / std::sqrt(6.283185307179586 * x)));
+    }
+    const double factor = PowerOverGamma(0.5 * x, order);
+    if (order > 0)
+        return factor * PlainSum(order, 0.25 * x * x);
+    const Extended square = ExactProduct(x, x);
+    if (std::isinf(factor))
+        return factor;
+    return factor * CarefulSum(order, {0.25 * square.high, 0.25 * square.low});
+}
+
+} // namespace qx

@@ -1,0 +1,190 @@
+#include "special/elliptic.h"
+
+#include "special/tables/elliptic.h"
+
+#include <cmath>
+#include <limits>
+
+namespace qx {
+
+namespace {
+
+constexpr double kNaN = std::numeric_limits<double>::quiet_NaN();
+constexpr double kEps = 2.220446049250313e-16;
+constexpr double kPi = 3.141592653589793;
+constexpr double kHalfPi = 1.5707963267948966;
+constexpr int kMostRounds = 40; // of Landen's transformation; about 8 are made
+
+bool IsParameter(double m) { return m >= 0 && m <= 1; }
+
+// F and E of 0 < phi < pi / 2, 0 < m < 1, in the scaled form of the transformation.
+struct Incomplete {
+    double first;  // F
+    double extra;  // E = F E(m) / K(m) + extra
+};
+
+Incomplete Landen(double phi, double m) {
+    double a = 1;
+    double b = std::sqrt(1 - m);
+    double c = std::sqrt(m);
+    double d = 1;
+    double t = std::tan(phi);
+    double turns = 0;
+    double extra = 0;
+    for (int round = 0; round < kMostRounds && std::fabs(c / a) > kEps; ++round) {
+        const double ratio = b / a;
+        phi += std::atan(t * ratio) + turns * kPi;
+        turns = std::floor((phi + kHalfPi) / kPi);
+        t *= (1 + ratio) / (1 - ratio * t * t);
+        c = 0.5 * (a - b);
+        const double mean = std::sqrt(a * b);
+        a = 0.5 * (a + b);
+        b = mean;
+        d += d;
+        extra += c * std::sin(phi);
+    }
+    return {(std::atan(t) + turns * kPi) / (d * a), extra};
+}
+
+// An amplitude as a multiple of pi and a rest within a quarter turn.
+struct Amplitude {
+    double halfTurns;
+    double rest;
+};
+
+Amplitude Split(double phi) {
+    if (std::fabs(phi) <= kHalfPi)
+        return {0, phi};
+    constexpr double piLow = 1.2246467991473532e-16; // pi less its double
+    const double n = std::rint(phi / kPi);
+    return {n, (phi - n * kPi) - n * piLow};
+}
+
+bool IsQuarter(double phi) { return std::fabs(phi - kHalfPi) <= kEps; }
+
+} // namespace
+
+double EllipticK(double m) {
+    if (!IsParameter(m))
+        return kNaN;
+    if (m <= 0.5)
+        return m == 0 ? kHalfPi : table::ellipticKSmall(m);
+    const double m1 = 1 - m;
+    return table::ellipticKNear(m1) - std::log(m1) * table::ellipticKLog(m1);
+}
+
+double EllipticE(double m) {
+    if (!IsParameter(m))
+        return kNaN;
+    if (m <= 0.5)
+        return m == 0 ? kHalfPi : table::ellipticESmall(m);
+    if (m == 1)
+        return 1;
+    const double m1 = 1 - m;
+    return table::ellipticENear(m1) - std::log(m1) * (m1 * table::ellipticELog(m1));
+}
+
+double EllipticF(double phi, double m) {
+    if (!IsParameter(m) || std::isnan(phi))
+        return kNaN;
+    if (std::isinf(phi))
+        return phi;
+    const Amplitude split = Split(phi);
+    if (split.halfTurns != 0)
+        return 2 * split.halfTurns * EllipticK(m) + EllipticF(split.rest, m);
+    if (phi == 0 || m == 0)
+        return phi;
+    const double size = std::fabs(phi);
+    double value;
+    if (IsQuarter(size))
+        value = EllipticK(m);
+    else if (m == 1)
+        value = std::log(std::tan(0.25 * kPi + 0.5 * size));
+    else
+        value = Landen(size, m).first;
+    return phi < 0 ? -value : value;
+}
+
+double EllipticE(double phi, double m) {
+    if (!IsParameter(m) || std::isnan(phi))
+        return kNaN;
+    if (std::isinf(phi))
+        return phi;
+    const Amplitude split = Split(phi);
+    if (split.halfTurns != 0)
+        return 2 * split.halfTurns * EllipticE(m) + EllipticE(split.rest, m);
+    if (phi == 0 || m == 0)
+        return phi;
+    const double size = std::fabs(phi);
+    double value;
+    if (IsQuarter(size)) {
+        value = EllipticE(m);
+    } else if (m == 1) {
+        value = std::sin(size);
+    } else {
+        const Incomplete parts = Landen(size, m);
+        value = parts.first * (EllipticE(m) / EllipticK(m)) + parts.extra;
+    }
+    return phi < 0 ? -value : value;
+}
+
+namespace {
+
+JacobiValues NearCircular(double u, double m) {
+    const double s = std::sin(u);
+    const double c = std::cos(u);
+    const double shift = 0.25 * m * (u - s * c);
+    return {s - shift * c, c + shift * s, 1 - 0.5 * m * s * s, u - shift};
+}
+
+JacobiValues NearHyperbolic(double u, double m1) {
+    const double t = std::tanh(u);
+    const double cosh = std::cosh(u);
+    const double sech = 1 / cosh;
+    const double product = std::sinh(u) * cosh;
+    const double quarter = 0.25 * m1;
+    const double gudermannian = 2 * std::atan(std::tanh(0.5 * u));
+    if (m1 == 0) // the products may overflow
+        return {t, sech, sech, gudermannian};
+    return {t + quarter * (product - u) * sech * sech, sech - quarter * (product - u) * t * sech,
+            sech + quarter * (product + u) * t * sech, gudermannian + quarter * (product - u) * sech};
+}
+
+JacobiValues ByMeans(double u, double m) {
+    constexpr int rounds = 8;
+    double a[rounds + 1] = {1};
+    double c[rounds + 1] = {std::sqrt(m)};
+    double b = std::sqrt(1 - m);
+    double scale = 1;
+    int i = 0;
+    while (i < rounds && std::fabs(c[i] / a[i]) > kEps) {
+        a[i + 1] = 0.5 * (a[i] + b);
+        c[i + 1] = 0.5 * (a[i] - b);
+        b = std::sqrt(a[i] * b);
+        scale += scale;
+        ++i;
+    }
+    double phi = scale * a[i] * u;
+    for (; i > 0; --i)
+        phi = 0.5 * (std::asin(c[i] * std::sin(phi) / a[i]) + phi);
+    const double sn = std::sin(phi);
+    const double cn = std::cos(phi);
+    return {sn, cn, std::sqrt(cn * cn + (1 - m) * sn * sn), phi};
+}
+
+} // namespace
+
+JacobiValues EllipticJacobi(double u, double m) {
+    if (!IsParameter(m) || !std::isfinite(u))
+        return {kNaN, kNaN, kNaN, kNaN};
+    // The first-order forms hold where the dropped second order, (m u)^2 or (m1 exp(2 u))^2 in
+    // size, is below eps; elsewhere the means serve.
+    if (m < 1e-9 && std::fabs(m * u) < 1e-8)
+        return NearCircular(u, m);
+    const double m1 = 1 - m;
+    if (m1 == 0 || (m > 0.999999999 && m1 * std::exp(2 * std::fabs(u)) < 1e-8))
+        return NearHyperbolic(u, m1);
+    return ByMeans(u, m);
+}
+
+} // namespace qx

@@ -1,0 +1,103 @@
+#include "special/struve.h"
+
+#include "special/bessel_real.h"
+#include "special/extended.h"
+#include "special/reciprocal_gamma.h"
+
+#include <cmath>
+#include <limits>
+
+namespace qx {
+
+namespace {
+
+constexpr double kNaN = std::numeric_limits<double>::quiet_NaN();
+constexpr double kEps = 2.220446049250313e-16;
+constexpr double kStop = 1.8046660579423136e-14;
+constexpr double kMostTerms = 200;
+constexpr double kLargestTerm = 1e35;
+constexpr double kUnusable = 1e38;
+constexpr double kHalfRootPi = 0.886226925452758;  // gamma(3/2)
+constexpr double kRootPi = 1.772453850905516;      // gamma(1/2)
+constexpr double kPairEps = 1e-31;                 // of sums in two doubles
+
+struct Estimate {
+    double sum;
+    double error;
+};
+
+// What a sum has come to: its last term and its largest give the estimate of the error.
+Estimate Judge(double sum, double last, double largest, double eps) {
+    const double size = std::fabs(sum);
+    return {sum, std::fmax(std::fabs(last) / size, largest * eps / size)};
+}
+
+Estimate Struve1F2(double x, double v) {
+    const Extended square = ExactProduct(x, x);
+    const Extended q = {-0.25 * square.high, -0.25 * square.low};
+    Extended term = {1, 0};
+    Extended sum = term;
+    double largest = 1;
+    double last = 1;
+    for (double k = 0; k < kMostTerms && largest < kLargestTerm; k += 1) {
+        const Extended divisor = Extended{k + 1.5, 0} * (ExactSum(v, k) + Extended{1.5, 0});
+        term = term * q / divisor;
+        sum = sum + term;
+        last = std::fabs(term.high);
+        largest = std::fmax(largest, last);
+        // the stated relative size would leave the last digits out, so the terms go on below it
+        if (last <= 0.01 * kStop * std::fabs(sum.high) && std::fabs(q.high) < std::fabs(divisor.high))
+            return {sum.high, Judge(sum.high, 0.0, largest, kPairEps).error};
+    }
+    return Judge(sum.high, last, largest, kPairEps);
+}
+
+Estimate Struve3F0(double x, double v) {
+    double term = 1;
+    double sum = 1;
+    double largest = 1;
+    double last = 1;
+    bool hasFallen = false;
+    for (double k = 0; k < kMostTerms && largest < kLargestTerm; k += 1) {
+        const double next = term * ((k + 0.5) * (0.5 - v + k)) * (-4 / x / x);
+        const double size = std::fabs(next);
+        if (hasFallen && size > last) // divergent from here on
+            break;
+        hasFallen = hasFallen || size < last;
+        term = next;
+        sum += term;
+        last = size;
+        largest = std::fmax(largest, last);
+        if (last <= 0.01 * kStop * std::fabs(sum))
+            break;
+    }
+    return Judge(sum, last, largest, kEps);
+}
+
+} // namespace
+
+double Struve(double x, double v) {
+    if (!std::isfinite(x) || !std::isfinite(v) || (x < 0 && !IsInteger(v)))
+        return kNaN;
+    if (x == 0)
+        return v < 0 ? kNaN : 0;
+    if (x < 0)
+        return IsOdd(v) ? Struve(-x, v) : -Struve(-x, v);
+    if (v < 0 && v - std::floor(v) == 0.5) {
+        const double value = BesselJ(-v, x);
+        return IsOdd(-v - 0.5) ? -value : value;
+    }
+
+    const bool ascends = x <= 30 || x <= 1.5 * std::fabs(v);
+    const Estimate first = ascends ? Struve1F2(x, v) : Estimate{0, kUnusable};
+    if (ascends && first.error < 0.25 * kEps) // the other candidate cannot be better
+        return first.sum * (0.5 * x / kHalfRootPi) *
+               (v > -1 ? PowerOverGamma(0.5 * x, v + 0.5) / std::sqrt(0.5 * x)
+                       : std::pow(0.5 * x, v) * ReciprocalGamma(v + 1.5));
+    const Estimate second = x >= 18 ? Struve3F0(x, v) : Estimate{0, kUnusable};
+    if (ascends && !(first.error > second.error))
+        return first.sum * 0.5 * x * std::pow(0.5 * x, v) * ReciprocalGamma(v + 1.5) / kHalfRootPi;
+    return second.sum * std::pow(0.5 * x, v - 1) * ReciprocalGamma(v + 0.5) / kRootPi + BesselY(v, x);
+}
+
+} // namespace qx

@@ -1,0 +1,144 @@
+"""Rational approximations by interpolation at Chebyshev points, in many digits.
+
+A rational interpolant at the Chebyshev points of the interval comes within a small factor of the
+minimax error. That is as good as minimax here, because degrees are chosen so that the error of
+the approximation stands well below half an ulp of a double.
+"""
+
+from mpmath import mp, mpf, matrix, lu_solve, cos, pi
+
+mp.dps = 60
+
+
+def nodes(a, b, n):
+    return [(a + b) / 2 + (b - a) / 2 * cos((2 * i + 1) * pi / (2 * n)) for i in range(n)]
+
+
+def horner(coefficients, x):
+    """Ascending coefficients."""
+    y = mpf(0)
+    for c in reversed(coefficients):
+        y = y * x + c
+    return y
+
+
+def as_double(x):
+    return mpf(float(x))
+
+
+def solve(points, function, p, q):
+    n = p + q + 1
+    system, right = matrix(n, n), matrix(n, 1)
+    for i, h in enumerate(points):
+        f = function(h)
+        for j in range(p + 1):
+            system[i, j] = h**j
+        for j in range(q):
+            system[i, p + 1 + j] = -f * h ** (j + 1)
+        right[i] = f
+    s = lu_solve(system, right)
+    return [s[j] for j in range(p + 1)], [mpf(1)] + [s[p + 1 + j] for j in range(q)]
+
+
+def fits(function, a, b, p, q, warp):
+    """(centre, exact coefficients, coefficients as doubles), in several ways of rounding.
+
+    The coefficients are in powers of the distance from the centre. Either all are rounded, or the
+    denominator is rounded first and the numerator then fitted to it, which makes up for the
+    rounding of the denominator where that is large.
+    """
+    low, high, unwarp = warp[0](a), warp[0](b), warp[1]
+    values = {}
+
+    def known(x):
+        if x not in values:
+            values[x] = function(x)
+        return values[x]
+    for centre in (as_double((a + b) / 2), mpf(0)):
+        def points(n):
+            return [unwarp(x) - centre for x in nodes(low, high, n)]
+        exact = solve(points(p + q + 1), lambda h: known(h + centre), p, q)
+        numerator, denominator = ([as_double(c) for c in cs] for cs in exact)
+        yield centre, exact, (numerator, denominator)
+        refitted, _ = solve(points(p + 1), lambda h: horner(exact[0], h) / horner(exact[1], h)
+                            * horner(denominator, h), p, 0)
+        yield centre, exact, ([as_double(c) for c in refitted], denominator)
+
+
+def errors(function, a, b, centre, sets, weight, points=151):
+    """The largest error relative to function * weight, for each pair of coefficient sets."""
+    worst = [mpf(0)] * len(sets)
+    signs = [None] * len(sets)
+    for i in range(points):
+        x = a + (b - a) * mpf(2 * i + 1) / (2 * points)
+        f = function(x)
+        for k, (numerator, denominator) in enumerate(sets):
+            q = horner(denominator, x - centre)
+            if signs[k] is not None and (q > 0) != signs[k]:
+                raise ArithmeticError("the denominator changes its sign in the interval")
+            signs[k] = q > 0
+            worst[k] = max(worst[k], abs(horner(numerator, x - centre) / q / f - 1) * weight(x))
+    return worst
+
+
+PLAIN = (lambda x: x, lambda x: x)
+
+
+class Table:
+    """A C++ header of coefficient sets, each with its interval and its measured error."""
+
+    def __init__(self, script, guard):
+        self.lines = [
+            f"#ifndef {guard}", f"#define {guard}", "", '#include "special/rational.h"', "",
+            f"// Made by tools/approximations/{script}. Each set: the centre, then numerator and",
+            "// denominator in ascending powers of the distance from the centre. The comment tells",
+            "// the degrees, the interval, and the largest relative error measured there, first with",
+            "// exact coefficients, then with these doubles.", "",
+            "namespace qx::table {", ""]
+        self.guard = guard
+
+    def values(self, values, indent="    "):
+        text = [f"{float(v)!r}" for v in values]
+        body, line = [], indent
+        for i, t in enumerate(text):
+            piece = t + ("," if i + 1 < len(text) else "")
+            if len(line) + len(piece) > 98:
+                body.append(line.rstrip())
+                line = indent
+            line += piece + " "
+        return body + [line.rstrip()]
+
+    def array(self, name, values):
+        self.lines += [f"inline constexpr double {name}[] = {{"] + self.values(values) + ["};"]
+
+    def comment(self, line):
+        while len(line) > 97:
+            cut = line.rindex(" ", 0, 97)
+            self.lines.append("// " + line[:cut])
+            line = line[cut + 1:]
+        self.lines.append("// " + line)
+
+    def add(self, name, what, function, a, b, p, q, warp=PLAIN, weight=lambda x: 1):
+        a, b = mpf(a), mpf(b)
+        best = None
+        for centre, exact, rounded in fits(function, a, b, p, q, warp):
+            try:
+                worst = errors(function, a, b, centre, [exact, rounded], weight, 41)
+            except ArithmeticError:
+                continue
+            if best is None or worst[1] < best[0]:
+                best = worst[1], centre, exact, rounded
+        _, centre, exact, rounded = best
+        worst = errors(function, a, b, centre, [exact, rounded], weight)
+        line = (f"{what}; degree {p} over {q} on [{mp.nstr(a, 6)}, {mp.nstr(b, 6)}]: "
+                f"{mp.nstr(worst[0], 2)}, {mp.nstr(worst[1], 2)}")
+        print(name, line, flush=True)
+        self.comment(line)
+        numerator, denominator = rounded
+        self.lines += [f"inline constexpr Rational<{p + 1}, {q + 1}> {name} = {{",
+                       f"    {float(centre)!r},", "    {"] + self.values(numerator, "        ") + \
+                      ["    },", "    {"] + self.values(denominator, "        ") + ["    }", "};", ""]
+
+    def write(self, path):
+        with open(path, "w") as file:
+            file.write("\n".join(self.lines + ["} // namespace qx::table", "", "#endif", ""]))
