@@ -83,6 +83,37 @@ AiryValues Series(double x) {
             sqrt3 * (c1 * fp + c2 * gp)};
 }
 
+// Ai and Ai' of the series in two doubles: their two parts cancel as x grows.
+void CarefulDecay(double x, AiryValues *values) {
+    constexpr Extended c1 = {0.3550280538878172, 2.05233632436212e-17};
+    constexpr Extended c2 = {0.2588194037928068, -2.522243111610832e-17};
+    const Extended square = ExactProduct(x, x);
+    const Extended cube = square * Extended{x, 0};
+    Extended f = {1, 0};
+    Extended g = {x, 0};
+    Extended fp = {0, 0};
+    Extended gp = {1, 0};
+    Extended termF = f;
+    Extended termG = g;
+    for (int k = 1; k < 100; ++k) {
+        const double n = 3 * k;
+        fp = fp + termF * square / Extended{n - 1, 0};
+        gp = gp + termG * square / Extended{n, 0};
+        termF = termF * cube / Extended{n * (n - 1), 0};
+        termG = termG * cube / Extended{n * (n + 1), 0};
+        f = f + termF;
+        g = g + termG;
+        if (termF.high <= 1e-20 * f.high)
+            break;
+    }
+    const Extended ai = c1 * f;
+    const Extended aip = c1 * fp;
+    const Extended lessAi = c2 * g;
+    const Extended lessAip = c2 * gp;
+    values->ai = (ai + Extended{-lessAi.high, -lessAi.low}).high;
+    values->aip = (aip + Extended{-lessAip.high, -lessAip.low}).high;
+}
+
 } // namespace
 
 AiryValues Airy(double x) {
@@ -94,8 +125,12 @@ AiryValues Airy(double x) {
         return {0, 0, largest, largest};
     if (x < -kSeriesLimit)
         return Oscillating(x);
-    if (x <= kSeriesLimit)
-        return Series(x);
+    if (x <= kSeriesLimit) {
+        AiryValues values = Series(x);
+        if (x > 0.5)
+            CarefulDecay(x, &values);
+        return values;
+    }
 
     const Extended zeta = Zeta(x);
     const double root = std::sqrt(std::sqrt(x));

@@ -154,7 +154,7 @@ double BesselY0(double x) {
         return 0;
     if (x >= kSmall)
         return Wave0(x).y;
-    return (table::y0Low(x * x) - 2) + kTwoOverPi * std::log(x) * BesselJ0(x);
+    return table::y0Low(x * x) + kTwoOverPi * std::log(x) * BesselJ0(x);
 }
 
 double BesselY1(double x) {
@@ -162,7 +162,7 @@ double BesselY1(double x) {
         return 0;
     if (x >= kSmall)
         return Wave1(x).y;
-    return x * (table::y1Low(x * x) - 2) + kTwoOverPi * (std::log(x) * BesselJ1(x) - 1 / x);
+    return x * table::y1Low(x * x) + kTwoOverPi * (std::log(x) * BesselJ1(x) - 1 / x);
 }
 
 double BesselJn(double n, double x) {
@@ -255,7 +255,7 @@ double BesselIn(double n, double x) {
     }
     // Downward from an order where I has fallen by 1e-17 relative to I_n; the trial values are
     // positive, so the recurrence is stable, and they cannot overflow: they grow by I0 / I_start.
-    const double start = n + std::ceil(std::sqrt(80 * (n + x))) * 0.5 + 20;
+    const double start = n + std::sqrt(80 * (n + x)) + 20;
     double above = 0;
     double value = 1e-290;
     double wanted = 0;
@@ -291,6 +291,8 @@ double BesselKn(double n, double x) {
         before = value;
         value = next;
     }
+    if (!std::isfinite(value)) // exp(x) K overflows, K itself perhaps not
+        return ModifiedBesselLargeOrder(n, x).k;
     return half * (value * half);
 }
 

@@ -53,12 +53,20 @@ Complex SeriesI(double n, double x) {
     return {factor * (c * sum.even - s * sum.odd), factor * (s * sum.even + c * sum.odd)};
 }
 
+// exp(+-z) of z = x exp(i pi / 4), whose parts are formed in two doubles.
+Complex ExpOnDiagonal(double x, double sign) {
+    constexpr Extended diagonal = {kDiagonal, -4.833646656726457e-17};
+    const Extended part = diagonal * Extended{sign * x, 0};
+    const Complex e = Exp(Complex{part.high, part.high});
+    return e * Complex{1 + part.low, part.low};
+}
+
 // K_0 and K_1 by Temme's continued fraction, |z| >= 2.
 struct OrdersZeroOne {
     Complex k0, k1;
 };
 
-OrdersZeroOne ContinuedK(Complex z) {
+OrdersZeroOne ContinuedK(Complex z, double x) {
     Complex b = (z + 1.0) * 2;
     Complex d = Complex{1, 0} / b;
     Complex h = d;
@@ -86,7 +94,7 @@ OrdersZeroOne ContinuedK(Complex z) {
             break;
     }
     OrdersZeroOne k = {};
-    k.k0 = SquareRoot(Complex{0.5 * kPi, 0} / z) * Exp(Complex{0, 0} - z) / s;
+    k.k0 = SquareRoot(Complex{0.5 * kPi, 0} / z) * ExpOnDiagonal(x, -1) / s;
     k.k1 = k.k0 * (z + 0.5 - h * 0.25) / z;
     return k;
 }
@@ -95,8 +103,8 @@ struct Neighbours {
     Complex k, next;
 };
 
-Neighbours UpwardK(int n, Complex z) {
-    const OrdersZeroOne start = ContinuedK(z);
+Neighbours UpwardK(int n, Complex z, double x) {
+    const OrdersZeroOne start = ContinuedK(z, x);
     Complex value = start.k0;
     Complex next = start.k1;
     for (int k = 1; k <= n; ++k) {
@@ -141,7 +149,7 @@ Complex SeriesK(int n, double x) {
             first.im - l * ber.im - 0.25 * kPi * ber.re + last.im};
 }
 
-Complex AsymptoticI(double n, Complex z) {
+Complex AsymptoticI(double n, Complex z, double x) {
     const double square = 4 * n * n;
     Complex term = {1, 0};
     Complex sum = term;
@@ -153,7 +161,7 @@ Complex AsymptoticI(double n, Complex z) {
         if (Size(term) <= 0.25 * kEps)
             break;
     }
-    return Exp(z) * (sum / SquareRoot(z * (2 * kPi)));
+    return ExpOnDiagonal(x, 1) * (sum / SquareRoot(z * (2 * kPi)));
 }
 
 // The ratio I_(n+1) / I_n by downward recurrence from far above, then the Wronskian.
@@ -162,7 +170,7 @@ Complex WronskianI(int n, Complex z, double x) {
     Complex ratio = {0, 0};
     for (int k = start; k > n; --k)
         ratio = Complex{1, 0} / (Complex{2.0 * k, 0} / z + ratio);
-    const Neighbours k = UpwardK(n, z);
+    const Neighbours k = UpwardK(n, z, x);
     return Complex{1, 0} / (z * (k.next + ratio * k.k));
 }
 
@@ -185,7 +193,7 @@ KelvinPair KelvinI(double x, int32_t n) {
         const ComplexModifiedPair pair = ModifiedBesselOnDiagonal(m, a);
         value = Turn({pair.iRe, pair.iIm}, m);
     } else if (a > 1100 || a >= std::fmax(40, m * m)) {
-        value = Turn(AsymptoticI(m, z), m);
+        value = Turn(AsymptoticI(m, z, a), m);
     } else {
         value = Turn(WronskianI(static_cast<int>(m), z, a), m);
     }
@@ -210,7 +218,7 @@ KelvinPair KelvinK(double x, int32_t n) {
         value = {0, 0};
     } else {
         const Complex z = {x * kDiagonal, x * kDiagonal};
-        value = Turn(UpwardK(static_cast<int>(m), z).k, quarters);
+        value = Turn(UpwardK(static_cast<int>(m), z, x).k, quarters);
     }
     return n < 0 && IsOdd(m) ? KelvinPair{-value.re, -value.im} : KelvinPair{value.re, value.im};
 }

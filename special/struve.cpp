@@ -74,6 +74,14 @@ Estimate Struve3F0(double x, double v) {
     return Judge(sum, last, largest, kEps);
 }
 
+// (x/2)^v / gamma(v + 1/2 + shift), shift 0 or 1, without overflow for large v.
+double Factor(double x, double v, double shift) {
+    const double half = 0.5 * x;
+    if (v < 1)
+        return std::pow(half, v) * ReciprocalGamma(v + 0.5 + shift);
+    return PowerOverGamma(half, v - 0.5 + shift) * (shift == 0 ? std::sqrt(half) : 1 / std::sqrt(half));
+}
+
 } // namespace
 
 double Struve(double x, double v) {
@@ -90,14 +98,11 @@ double Struve(double x, double v) {
 
     const bool ascends = x <= 30 || x <= 1.5 * std::fabs(v);
     const Estimate first = ascends ? Struve1F2(x, v) : Estimate{0, kUnusable};
-    if (ascends && first.error < 0.25 * kEps) // the other candidate cannot be better
-        return first.sum * (0.5 * x / kHalfRootPi) *
-               (v > -1 ? PowerOverGamma(0.5 * x, v + 0.5) / std::sqrt(0.5 * x)
-                       : std::pow(0.5 * x, v) * ReciprocalGamma(v + 1.5));
-    const Estimate second = x >= 18 ? Struve3F0(x, v) : Estimate{0, kUnusable};
+    const bool certain = first.error < 0.25 * kEps; // the other candidate cannot be better
+    const Estimate second = x >= 18 && !certain ? Struve3F0(x, v) : Estimate{0, kUnusable};
     if (ascends && !(first.error > second.error))
-        return first.sum * 0.5 * x * std::pow(0.5 * x, v) * ReciprocalGamma(v + 1.5) / kHalfRootPi;
-    return second.sum * std::pow(0.5 * x, v - 1) * ReciprocalGamma(v + 0.5) / kRootPi + BesselY(v, x);
+        return first.sum * (0.5 * x / kHalfRootPi) * Factor(x, v, 1);
+    return second.sum * (Factor(x, v, 0) / (0.5 * x)) / kRootPi + BesselY(v, x);
 }
 
 } // namespace qx

@@ -20,10 +20,10 @@ double Zeta(double x) {
     if (x < 0) {
         // (2 pi)^x sin(pi x / 2) gamma(s) zeta(s) / pi, s = 1 - x
         const double s = 1 - x;
-        const double rest = x - (1 - s); // what s has rounded away changes zeta next to 1 only
-        const double value = Zeta(s) * std::pow(2 * pi, x) * SinPi(0.5 * x) /
-                             (ReciprocalGamma(s) * pi);
-        return s == 1 ? -0.5 - 0.9189385332046727 * rest : value;
+        if (s == 1)
+            return -0.5;
+        const double pole = (s - 1) / -x; // what s has rounded away counts next to the pole only
+        return Zeta(s) * pole * std::pow(2 * pi, x) * SinPi(0.5 * x) / (ReciprocalGamma(s) * pi);
     }
     if (x >= 127)
         return 1;

@@ -9,6 +9,7 @@ const std::vector<Recipe> &AllRecipes() {
                  BasicStatisticsRecipes(),
                  DistributionRecipes(),
                  FFTRecipes(),
+                 SpecialBesselRecipes(),
                  SpectraRecipes(),
                  TransformRecipes(),
                  WindowRecipes(),

@@ -8,6 +8,7 @@ namespace qx::test {
 std::vector<Recipe> BasicStatisticsRecipes();
 std::vector<Recipe> DistributionRecipes();
 std::vector<Recipe> FFTRecipes();
+std::vector<Recipe> SpecialBesselRecipes();
 std::vector<Recipe> SpectraRecipes();
 std::vector<Recipe> TransformRecipes();
 std::vector<Recipe> WindowRecipes();

@@ -118,9 +118,12 @@ class Table:
             line = line[cut + 1:]
         self.lines.append("// " + line)
 
-    def add(self, name, what, function, a, b, p, q, warp=PLAIN, weight=lambda x: 1):
+    def add(self, name, what, function, a, b, p, q, warp=PLAIN, weight=lambda x: 1, shift=0):
+        """With a shift the fit and the error are those of function + shift, which then has no zero."""
         a, b = mpf(a), mpf(b)
         best = None
+        plain = function
+        function = (lambda x: plain(x) + shift) if shift else plain
         for centre, exact, rounded in fits(function, a, b, p, q, warp):
             try:
                 worst = errors(function, a, b, centre, [exact, rounded], weight, 41)
@@ -135,6 +138,8 @@ class Table:
         print(name, line, flush=True)
         self.comment(line)
         numerator, denominator = rounded
+        if shift:
+            numerator = [c - shift * d for c, d in zip(exact[0], denominator + [0] * p)]
         self.lines += [f"inline constexpr Rational<{p + 1}, {q + 1}> {name} = {{",
                        f"    {float(centre)!r},", "    {"] + self.values(numerator, "        ") + \
                       ["    },", "    {"] + self.values(denominator, "        ") + ["    }", "};", ""]
