@@ -57,9 +57,7 @@ Wave Wave1(double x) {
 double I0Scaled(double x) { // x >= 8: sqrt(x) exp(-x) I0(x)
     return x < 24 ? table::i0Mid(1 / x) : table::i0Far(1 / x);
 }
-double I1Scaled(double x) {
-    return x < 24 ? table::i1Mid(1 / x) : table::i1Far(1 / x);
-}
+double I1Scaled(double x) { return x < 24 ? table::i1Mid(1 / x) : table::i1Far(1 / x); }
 
 double I0(double x) {
     if (x < kTiny)
@@ -87,7 +85,8 @@ ScaledK KScaled(double x) {
         const double e = std::exp(x);
         const double l = std::log(x);
         const double z = x * x;
-        return {e * (table::k0Small(z) - l * I0(x)), e * (1 / x + (x * table::k1Small(z) + l * I1(x)))};
+        return {e * (table::k0Small(z) - l * I0(x)),
+                e * (1 / x + (x * table::k1Small(z) + l * I1(x)))};
     }
     const double u = 1 / x;
     const double root = std::sqrt(x);

@@ -80,8 +80,7 @@ OscillatingPair Turning(double order, double x) {
     const double r = 1 / (order * order);
     const double a = 1 + r * ((table::olverA1(w) - 1) + r * (table::olverA2(w) - 1));
     // B stands with order^(-5/3), a factor order^(-1/3) of which is in the scale
-    const double c =
-        (table::olverB0(w) + r * (table::olverB1(w) - 1)) / (order * third);
+    const double c = (table::olverB0(w) + r * (table::olverB1(w) - 1)) / (order * third);
     const double scale = table::olverFactor(w) / third;
     const double y = scale * (airy.bi * a + airy.bip * c);
     return {scale * (airy.ai * a + airy.aip * c), std::isfinite(y) ? -y : -kInfinity};

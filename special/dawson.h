@@ -4,9 +4,9 @@
 namespace qx {
 
 // Dawson's integral exp(-x^2) times the integral of exp(t^2) from 0 to x; NaN for NaN and
-// infinities. |x| < 3.25: x R(x^2). Beyond: (1 + y R(y)) / (2 x) with y = 1 / x^2 and a set each for
-// |x| < 6.25, where the growing exponential still shows, and for larger arguments; above 1e9 the
-// correction is below half an ulp.
+// infinities. |x| < 3.25: x R(x^2). Beyond: (1 + y R(y)) / (2 x) with y = 1 / x^2 and a set each
+// for |x| < 6.25, where the growing exponential still shows, and for larger arguments; above 1e9
+// the correction is below half an ulp.
 double Dawson(double x);
 
 struct FresnelValues {

@@ -19,8 +19,8 @@ bool IsParameter(double m) { return m >= 0 && m <= 1; }
 
 // F and E of 0 < phi < pi / 2, 0 < m < 1, in the scaled form of the transformation.
 struct Incomplete {
-    double first;  // F
-    double extra;  // E = F E(m) / K(m) + extra
+    double first; // F
+    double extra; // E = F E(m) / K(m) + extra
 };
 
 Incomplete Landen(double phi, double m) {
@@ -147,7 +147,8 @@ JacobiValues NearHyperbolic(double u, double m1) {
     if (m1 == 0) // the products may overflow
         return {t, sech, sech, gudermannian};
     return {t + quarter * (product - u) * sech * sech, sech - quarter * (product - u) * t * sech,
-            sech + quarter * (product + u) * t * sech, gudermannian + quarter * (product - u) * sech};
+            sech + quarter * (product + u) * t * sech,
+            gudermannian + quarter * (product - u) * sech};
 }
 
 JacobiValues ByMeans(double u, double m) {

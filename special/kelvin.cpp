@@ -144,7 +144,8 @@ Complex SeriesK(int n, double x) {
     const auto part = [](double phase, double sum) { return phase == 0 ? 0.0 : phase * sum; };
     const Complex first = {part(c, finite.even) - part(s, finite.odd),
                            -(part(s, finite.even) + part(c, finite.odd))};
-    const Complex last = {c * infinite.even - s * infinite.odd, s * infinite.even + c * infinite.odd};
+    const Complex last = {c * infinite.even - s * infinite.odd,
+                          s * infinite.even + c * infinite.odd};
     return {first.re - l * ber.re + 0.25 * kPi * ber.im + last.re,
             first.im - l * ber.im - 0.25 * kPi * ber.re + last.im};
 }

@@ -13,7 +13,9 @@ namespace {
 constexpr double kNaN = std::numeric_limits<double>::quiet_NaN();
 constexpr double kInfinity = std::numeric_limits<double>::infinity();
 constexpr double kEps = 2.220446049250313e-16;
+// Below 40 the other methods serve, so the asymptotic series has to be as good as they are.
 constexpr double kAsymptoticLimit = 1e-12;
+constexpr double kAsymptoticLimitBelow40 = 1e-15;
 constexpr double kRootPi = 1.772453850905516;
 constexpr double kRootTwoPi = 2.5066282746310002;
 constexpr double kRootTwo = 1.4142135623730951;
@@ -43,7 +45,8 @@ bool AsymptoticSum(double a, double x, double sign, double *sum) {
             break;
     }
     // a sum far below its terms has cancelled
-    return std::fabs(term) <= kAsymptoticLimit * std::fabs(*sum) && std::fabs(*sum) > 1e-2;
+    const double limit = x < 40 ? kAsymptoticLimitBelow40 : kAsymptoticLimit;
+    return std::fabs(term) <= limit * std::fabs(*sum) && std::fabs(*sum) > 1e-2;
 }
 
 bool ParabolicAsymptotic(double x, double v, double *value) {

@@ -16,8 +16,8 @@ constexpr double kStirlingFrom = 20;
 
 // ln gamma(v) - ((v - 1/2) ln v - v + ln sqrt(2 pi)) for v >= 20, to full precision.
 double StirlingCorrection(double v) {
-    constexpr double c[] = {1.0 / 12, -1.0 / 360, 1.0 / 1260, -1.0 / 1680, 1.0 / 1188,
-                            -691.0 / 360360, 1.0 / 156};
+    constexpr double c[] = {1.0 / 12,   -1.0 / 360,      1.0 / 1260, -1.0 / 1680,
+                            1.0 / 1188, -691.0 / 360360, 1.0 / 156};
     const double z = 1 / (v * v);
     return Horner(c, z) / v;
 }
@@ -58,7 +58,8 @@ double ReciprocalGamma(double x) {
 double PowerOverGamma(double y, double order) {
     if (order >= kStirlingFrom)
         return StirlingPower(y, order);
-    if (order <= -kStirlingFrom) { // by reflection, 1 / gamma(1 - a) = gamma(a + 1) sin(pi a) / (pi a)
+    if (order <=
+        -kStirlingFrom) { // by reflection, 1 / gamma(1 - a) = gamma(a + 1) sin(pi a) / (pi a)
         const double sine = SinPi(-order);
         return sine == 0 ? 0.0 : sine / (-kPi * order) / StirlingPower(y, -order);
     }

@@ -17,9 +17,9 @@ constexpr double kStop = 1.8046660579423136e-14;
 constexpr double kMostTerms = 200;
 constexpr double kLargestTerm = 1e35;
 constexpr double kUnusable = 1e38;
-constexpr double kHalfRootPi = 0.886226925452758;  // gamma(3/2)
-constexpr double kRootPi = 1.772453850905516;      // gamma(1/2)
-constexpr double kPairEps = 1e-31;                 // of sums in two doubles
+constexpr double kHalfRootPi = 0.886226925452758; // gamma(3/2)
+constexpr double kRootPi = 1.772453850905516;     // gamma(1/2)
+constexpr double kPairEps = 1e-31;                // of sums in two doubles
 
 struct Estimate {
     double sum;
@@ -46,7 +46,8 @@ Estimate Struve1F2(double x, double v) {
         last = std::fabs(term.high);
         largest = std::fmax(largest, last);
         // the stated relative size would leave the last digits out, so the terms go on below it
-        if (last <= 0.01 * kStop * std::fabs(sum.high) && std::fabs(q.high) < std::fabs(divisor.high))
+        if (last <= 0.01 * kStop * std::fabs(sum.high) &&
+            std::fabs(q.high) < std::fabs(divisor.high))
             return {sum.high, Judge(sum.high, 0.0, largest, kPairEps).error};
     }
     return Judge(sum.high, last, largest, kPairEps);
@@ -79,7 +80,8 @@ double Factor(double x, double v, double shift) {
     const double half = 0.5 * x;
     if (v < 1)
         return std::pow(half, v) * ReciprocalGamma(v + 0.5 + shift);
-    return PowerOverGamma(half, v - 0.5 + shift) * (shift == 0 ? std::sqrt(half) : 1 / std::sqrt(half));
+    return PowerOverGamma(half, v - 0.5 + shift) *
+           (shift == 0 ? std::sqrt(half) : 1 / std::sqrt(half));
 }
 
 } // namespace
