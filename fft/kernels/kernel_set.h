@@ -90,6 +90,67 @@ QX_INLINE void RunReal(const In &in, const Out &out) {
 
 // ---- Leaves ----
 
+template <int P>
+__attribute__((noinline)) void ComplexLeafColumn(const ColumnIn &in, const ColumnOut &out) {
+    RunPacked<P, One>(in, out);
+}
+
+template <int P>
+void ComplexSideBySide(const DBL *in, DBL *out) {
+    RunPacked<P, One>(SideBySideIn{in}, SideBySideOut{out});
+}
+
+template <int P>
+__attribute__((noinline)) void ComplexLeafRows(const DBL *in, DBL *out,
+                                               const LeafColumns &columns) {
+    for (ptrdiff_t b = 0; b < columns.count[1]; ++b) {
+        const DBL *column = in + b * columns.inStride[1];
+        DBL *results = out + b * columns.outStride[1];
+        ptrdiff_t left = columns.count[0];
+        for (; left >= packedColumns; left -= packedColumns) {
+            PackedGatherIn x;
+            PackedBlocksOut y;
+            for (int i = 0; i < packedColumns; ++i) {
+                x.x[i] = column;
+                y.y[i] = results;
+                column += columns.inStride[0];
+                results += columns.outStride[0];
+            }
+            x.leg = columns.legStride;
+            RunPacked<P, Wide>(x, y);
+        }
+        if (left > 0)
+            ComplexLeafColumn<P>({column, column + 1, columns.legStride},
+                                 {results, results + 1, 2});
+    }
+}
+
+template <int P>
+void ComplexLanesLeaf(const DBL *in, DBL *out, const LeafColumns &columns) {
+    constexpr int width = 2 * leafBundle;
+    if (columns.count[0] != leafBundle || columns.inStride[0] != 2 ||
+        !legsCollide(columns.legStride, P)) {
+        ComplexLeafRows<P>(in, out, columns);
+        return;
+    }
+    double rows[P * width];
+    const LeafColumns onStack = {{leafBundle, 1}, {2, 0}, {columns.outStride[0], 0}, width};
+    for (ptrdiff_t b = 0; b < columns.count[1]; ++b) {
+        CopyRows<width>(in + b * columns.inStride[1], columns.legStride, rows, width, P);
+        ComplexLeafRows<P>(rows, out + b * columns.outStride[1], onStack);
+    }
+}
+
+template <int P>
+__attribute__((noinline)) void RealLeafColumn(const RealColumnIn &in, const RealColumnOut &out) {
+    RunReal<P, Narrow>(in, out);
+}
+
+template <int P>
+void RealSideBySide(const DBL *in, DBL *out) {
+    RunReal<P, Narrow>(RealColumnIn{in, 1}, RealColumnOut{out, 1});
+}
+
 // Walks over the columns of a leaf.
 class ColumnWalk {
 public:
@@ -109,67 +170,6 @@ private:
     ptrdiff_t a_ = 0;
     ptrdiff_t b_ = 0;
 };
-
-template <int P>
-__attribute__((noinline)) void ComplexLeafColumn(const ColumnIn &in, const ColumnOut &out) {
-    RunPacked<P, One>(in, out);
-}
-
-template <int P>
-void ComplexSideBySide(const DBL *in, DBL *out) {
-    RunPacked<P, One>(SideBySideIn{in}, SideBySideOut{out});
-}
-
-template <int P>
-__attribute__((noinline)) void ComplexLeafWalk(const DBL *in, DBL *out,
-                                               const LeafColumns &columns) {
-    ptrdiff_t inAt[packedColumns];
-    ptrdiff_t outAt[packedColumns];
-    ColumnWalk walk(columns);
-    for (ptrdiff_t left = columns.count[0] * columns.count[1]; left > 0; left -= packedColumns) {
-        if (left < packedColumns) {
-            walk.take(inAt, outAt);
-            ComplexLeafColumn<P>({in + *inAt, in + *inAt + 1, columns.legStride},
-                                 {out + *outAt, out + *outAt + 1, 2});
-            return;
-        }
-        PackedGatherIn x;
-        PackedBlocksOut y;
-        for (int i = 0; i < packedColumns; ++i) {
-            walk.take(inAt, outAt);
-            x.x[i] = in + *inAt;
-            y.y[i] = out + *outAt;
-        }
-        x.leg = columns.legStride;
-        RunPacked<P, Wide>(x, y);
-    }
-}
-
-template <int P>
-void ComplexLanesLeaf(const DBL *in, DBL *out, const LeafColumns &columns) {
-    constexpr int width = 2 * leafBundle;
-    if (columns.count[0] != leafBundle || columns.inStride[0] != 2 ||
-        !legsCollide(columns.legStride, P)) {
-        ComplexLeafWalk<P>(in, out, columns);
-        return;
-    }
-    double rows[P * width];
-    const LeafColumns onStack = {{leafBundle, 1}, {2, 0}, {columns.outStride[0], 0}, width};
-    for (ptrdiff_t b = 0; b < columns.count[1]; ++b) {
-        CopyRows<width>(in + b * columns.inStride[1], columns.legStride, rows, width, P);
-        ComplexLeafWalk<P>(rows, out + b * columns.outStride[1], onStack);
-    }
-}
-
-template <int P>
-__attribute__((noinline)) void RealLeafColumn(const RealColumnIn &in, const RealColumnOut &out) {
-    RunReal<P, Narrow>(in, out);
-}
-
-template <int P>
-void RealSideBySide(const DBL *in, DBL *out) {
-    RunReal<P, Narrow>(RealColumnIn{in, 1}, RealColumnOut{out, 1});
-}
 
 // Columns in any place; lanes behind the last one repeat it.
 template <int P>
