@@ -166,8 +166,11 @@ JacobiValues ByMeans(double u, double m) {
         ++i;
     }
     double phi = scale * a[i] * u;
-    for (; i > 0; --i)
-        phi = 0.5 * (std::asin(c[i] * std::sin(phi) / a[i]) + phi);
+    for (; i > 0; --i) {
+        const double sine = c[i] * std::sin(phi) / a[i];
+        // a small arc sine is its argument to the last bit
+        phi = 0.5 * ((std::fabs(sine) < 1e-8 ? sine : std::asin(sine)) + phi);
+    }
     const double sn = std::sin(phi);
     const double cn = std::cos(phi);
     return {sn, cn, std::sqrt(cn * cn + (1 - m) * sn * sn), phi};

@@ -1,0 +1,1 @@
+qx_bench(special SOURCES special.cpp special_bessel.cpp PEERS gsl)
