@@ -19,7 +19,6 @@ def airy_wave(power):
     return lambda x: sqrt(1 / pi) * abs(x)**power if x < -1 else mpf(0)
 
 
-AIRY = [("[-1000, -2.09]", single(logarithmic(2.09, 1000))), ]
 AIRY = [("[-1000, -2.09]", single([-x for x in logarithmic(2.09, 1000)] + around(-2.09))),
         ("[-2.09, 2.09]", single(linear(-2.09, 2.09) + around(2.09))),
         ("[2.09, 8.32]", single(linear(2.09, 8.3203353) + around(8.3203353))),
