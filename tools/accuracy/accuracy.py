@@ -205,7 +205,8 @@ def table(function, library, verbose):
         for name in PEERS:
             peer = function.peers.get(name)
             columns.append(text(measure(peer, kept, references, scales)[0]) if peer else "")
-        lines.append(f"| {interval} | {len(kept)} | {text(peak)} | {text(rms)} | " + " | ".join(columns) + " |")
+        cell = interval.replace("|", "\\|")  # a bar would end the cell
+        lines.append(f"| {cell} | {len(kept)} | {text(peak)} | {text(rms)} | " + " | ".join(columns) + " |")
         if verbose:
             print(f"{function.title:22} {interval:38} {text(peak):>9} {text(rms):>9}  " +
                   " ".join(f"{c or '-':>9}" for c in columns) + f"  at {where}", flush=True)
