@@ -50,6 +50,20 @@ void FFTHalfToFull(DBL *buffer, int32_t n, int32_t shift) {
     expand(buffer, n);
 }
 
+void FFTCompactToFull(DBL *buffer, int32_t n) {
+    const std::ptrdiff_t length = n;
+    const DBL *const h = buffer + length;
+    const double nyquist = h[length / 2];
+    // Element k ends at 2k + 1, which reaches into h only where h[0] stood.
+    SetElement(buffer, 0, h[0], 0);
+    for (std::ptrdiff_t k = 1; k <= (length - 1) / 2; ++k)
+        SetElement(buffer, k, h[k], h[length - k]);
+    for (std::ptrdiff_t k = 1; k <= (length - 1) / 2; ++k)
+        SetElement(buffer, length - k, buffer[2 * k], -buffer[2 * k + 1]);
+    if (n % 2 == 0)
+        SetElement(buffer, length / 2, nyquist, 0);
+}
+
 void FFTFullToHalf(const DBL *in, int32_t n, int32_t shift, DBL *h) {
     const std::ptrdiff_t length = n;
     const DBL *const zero = in + (shift == 0 ? 0 : length / 2 * 2);
