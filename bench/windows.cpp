@@ -32,8 +32,11 @@ int main() {
     };
     std::printf("%-32s %10s %12s %8s\n", "window", "samples", "ours ns", "ratio");
     qx::bench::Ratios all("cosine sums / one cosine per term");
-    for (const Window &window : {Window{"Hanning", 1}, {"Blackman", 5}, {"Blackman-Harris 4", 7},
-                                 {"flat top", 6}, {"Blackman-Harris 7", 8}})
+    for (const Window &window : {Window{"Hanning", 1},
+                                 {"Blackman", 5},
+                                 {"Blackman-Harris 4", 7},
+                                 {"flat top", 6},
+                                 {"Blackman-Harris 7", 8}})
         for (const int32_t n : {1000, 10000, 100000, 1000000}) {
             std::vector<double> x(static_cast<std::size_t>(n), 1.0);
             const qx::CosineCoefficients &coefs = qx::CosineWindowCoefs(window.selector);

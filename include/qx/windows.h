@@ -142,18 +142,22 @@ QX_API ErrorCode CxSymmWinH(QX_INOUT CDB1D x, int32_t selector, double param);
     stored values, so x may be empty there. The parameter is used as it stands; that of selector 61
     is a linear ratio.
     -20061 another selector, -20003 x is empty. */
-QX_API ErrorCode ScaledWinH(QX_INOUT DBL1D x, int32_t selector, double param, QX_OUT WindowConstants *constants);
+QX_API ErrorCode ScaledWinH(QX_INOUT DBL1D x, int32_t selector, double param,
+                            QX_OUT WindowConstants *constants);
 /** ScaledWinH for complex samples. */
-QX_API ErrorCode CxScaledWinH(QX_INOUT CDB1D x, int32_t selector, double param, QX_OUT WindowConstants *constants);
+QX_API ErrorCode CxScaledWinH(QX_INOUT CDB1D x, int32_t selector, double param,
+                              QX_OUT WindowConstants *constants);
 
 /** Any window in any form: divided by its coherent gain if `scaled` is non-zero, symmetric if
     `symmetric` is non-zero. A NaN as parameter, for selectors 61 and 62 also a negative one, means
     the default; that of selector 61 is in decibels.
     -20061 both forms at once or an unknown selector, -20003 x is empty, then as the exports of the
     windows. */
-QX_API ErrorCode AllWinH(QX_INOUT DBL1D x, int32_t selector, double param, int32_t scaled, int32_t symmetric);
+QX_API ErrorCode AllWinH(QX_INOUT DBL1D x, int32_t selector, double param, int32_t scaled,
+                         int32_t symmetric);
 /** AllWinH for complex samples. */
-QX_API ErrorCode CxAllWinH(QX_INOUT CDB1D x, int32_t selector, double param, int32_t scaled, int32_t symmetric);
+QX_API ErrorCode CxAllWinH(QX_INOUT CDB1D x, int32_t selector, double param, int32_t scaled,
+                           int32_t symmetric);
 
 /** KaiserH with its code in *err; the function result is 0. */
 QX_API int32_t Kaiser_Bessel(QX_INOUT DBL1D x, QX_IN const DBL *beta, QX_OUT ErrorCode *err);

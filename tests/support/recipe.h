@@ -195,8 +195,8 @@ struct ExportHash {
     bool mayDiffer = false; // from processor to processor
 };
 typedef std::function<int32_t(const Recipe &, Call &)> Caller;
-std::map<std::string, ExportHash>
-HashEveryExport(const Caller &caller = [](const Recipe &recipe, Call &call) {
+std::map<std::string, ExportHash> HashEveryExport(const Caller &caller = [](const Recipe &recipe,
+                                                                            Call &call) {
     return recipe.run(call);
 });
 
