@@ -75,7 +75,7 @@ ErrorCode BinnedMode(const DBL *x, int32_t n, int32_t intervals, DBL **modes, in
     void *centres;
     if (const ErrorCode status = AllocateValues(intervals, &centres))
         return status;
-    auto *centre = static_cast<DBL *>(centres);
+    DBL *centre = static_cast<DBL *>(centres);
     ErrorCode status = ArrayHistogram(x, n, min, max, counts.data(), centre, intervals);
     if (status < 0) {
         ScratchFree(centres);
@@ -92,7 +92,7 @@ ErrorCode ExactMode(const DBL *x, int32_t n, DBL **modes, int32_t *count) {
     void *block;
     if (const ErrorCode status = AllocateValues(n, &block))
         return status;
-    auto *a = static_cast<DBL *>(block);
+    DBL *a = static_cast<DBL *>(block); // auto would drop the alignment
     SortAscending(x, n, 0, a);
     if (std::fabs(a[0] - a[n - 1]) <= std::fabs(a[0]) * epsilon) {
         const ModeList single = {a, n, 1};
