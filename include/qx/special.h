@@ -5,5 +5,6 @@
    sign of a fault. */
 
 #include "qx/special_bessel.h"
+#include "qx/special_gamma.h"
 
 #endif

@@ -10,6 +10,7 @@ const std::vector<Recipe> &AllRecipes() {
                  DistributionRecipes(),
                  FFTRecipes(),
                  SpecialBesselRecipes(),
+                 SpecialGammaRecipes(),
                  SpectraRecipes(),
                  TransformRecipes(),
                  WindowRecipes(),

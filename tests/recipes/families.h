@@ -9,6 +9,7 @@ std::vector<Recipe> BasicStatisticsRecipes();
 std::vector<Recipe> DistributionRecipes();
 std::vector<Recipe> FFTRecipes();
 std::vector<Recipe> SpecialBesselRecipes();
+std::vector<Recipe> SpecialGammaRecipes();
 std::vector<Recipe> SpectraRecipes();
 std::vector<Recipe> TransformRecipes();
 std::vector<Recipe> WindowRecipes();

@@ -1,0 +1,76 @@
+#include "special/factorial.h"
+
+#include "special/extended.h"
+#include "stats/gamma.h"
+
+#include <limits>
+
+namespace qx {
+
+namespace {
+
+constexpr double kNaN = std::numeric_limits<double>::quiet_NaN();
+constexpr int32_t kLastInTable = 33;
+constexpr int32_t kLastProduct = 50;
+
+constexpr double kTable[] = {1.,
+                             1.,
+                             2.,
+                             6.,
+                             24.,
+                             120.,
+                             720.,
+                             5040.,
+                             40320.,
+                             362880.,
+                             3628800.,
+                             39916800.,
+                             479001600.,
+                             6227020800.,
+                             87178291200.,
+                             1307674368000.,
+                             20922789888000.,
+                             355687428096000.,
+                             6402373705728000.,
+                             121645100408832000.,
+                             2432902008176640000.,
+                             51090942171709440000.,
+                             1124000727777607680000.,
+                             25852016738884976640000.,
+                             620448401733239439360000.,
+                             15511210043330985984000000.,
+                             403291461126605635584000000.,
+                             10888869450418352160768000000.,
+                             304888344611713860501504000000.,
+                             8841761993739701954543616000000.,
+                             265252859812191058636308480000000.,
+                             8222838654177922817725562880000000.,
+                             263130836933693530167218012160000000.,
+                             8683317618811886495518194401280000000.};
+static_assert(sizeof kTable / sizeof kTable[0] == kLastInTable + 1);
+
+// What the double of 33! leaves off; the sum of both is exact.
+constexpr double kRestOfLast = 5.568025205059617e+20;
+
+} // namespace
+
+double Factorial(int32_t n) {
+    if (n < 0)
+        return kNaN;
+    if (n <= kLastInTable)
+        return kTable[n];
+    if (n > kLastProduct)
+        return GammaFunction(n + 1.0);
+    Extended product = {kTable[kLastInTable], kRestOfLast};
+    for (int32_t k = kLastInTable + 1; k <= n; ++k)
+        product = product * Extended{static_cast<double>(k), 0};
+    return product.high;
+}
+
+double LnFactorial(int32_t n) {
+    if (n < 0)
+        return kNaN;
+    return n == 1 ? 0.0 : LnGammaFunction(n + 1.0);
+}
+
+} // namespace qx

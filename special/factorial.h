@@ -1,0 +1,17 @@
+#ifndef QX_SPECIAL_FACTORIAL_H
+#define QX_SPECIAL_FACTORIAL_H
+
+#include <cstdint>
+
+namespace qx {
+
+// n!: a table up to 33, the running product in extended precision up to 50, GammaFunction beyond.
+// NaN for n < 0; +infinity from 171 on.
+double Factorial(int32_t n);
+
+// ln n! by LnGammaFunction. NaN for n < 0.
+double LnFactorial(int32_t n);
+
+} // namespace qx
+
+#endif
