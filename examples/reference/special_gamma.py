@@ -27,22 +27,3 @@ x = np.linspace(0.001, 12, 400)
 plot(x, {f"P({a}, x)": qx.call("QX_Gamma", a, x) for a in (0.5, 2.0, 6.0)})
 x = np.linspace(0.001, 0.999, 400)
 plot(x, {f"I x({a}, {b})": qx.call("QX_Beta", a, b, x) for a, b in ((0.5, 0.5), (2.0, 5.0))})
-
-#%% Error function and exponential integrals
-x = np.linspace(0.01, 4, 400)
-plot(x, {"erf": qx.call("QX_Erf", x), "erfc": qx.call("QX_ErfC", x),
-         "E 1": qx.call("QX_ExpI", x, 1), "E 2": qx.call("QX_ExpI", x, 2)}, (0, 2))
-
-#%% Sine and cosine integrals
-x = np.linspace(0.05, 20, 500)
-plot(x, {"Si": qx.call("QX_SinI", x), "Ci": qx.call("QX_CosI", x)})
-x = np.linspace(0.05, 3, 300)
-plot(x, {"Shi": qx.call("QX_SinhI", x), "Chi": qx.call("QX_CoshI", x)})
-
-#%% Hypergeometric functions and the dilogarithm
-x = np.linspace(-0.95, 0.95, 300)
-plot(x, {"2F1(1, 1; 2; x)": qx.call("QX_Gauss_2011", x, 1.0, 1.0, 2.0),
-         "1F1(1; 2; x)": qx.call("QX_Kummer", x, 1.0, 2.0)})
-x = np.linspace(0.01, 4, 300)
-plot(x, {"U(1, 2, x)": qx.call("QX_Tricomi", x, 1.0, 2.0), "Li2(1 - x)": qx.call("QX_Diln", x)},
-     (-2, 6))
