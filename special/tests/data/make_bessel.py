@@ -8,26 +8,8 @@ usage: make_bessel.py > bessel.txt
 """
 
 import mpmath
-from mpmath import mp, mpf, pi, sqrt
-
-mp.dps = 40
-EPS = mpf(2)**-52
-STEP = mpf(2)**-40  # off a threshold, to either side
-
-
-def sides(*thresholds):
-    for t in thresholds:
-        yield float(mpf(t) * (1 - STEP))
-        yield float(mpf(t) * (1 + STEP))
-
-
-def row(name, arguments, output, value, tolerance, scale=0):
-    value = mpmath.re(value)
-    if not 1e-290 < abs(value) < 1e300:
-        return
-    bound = tolerance * EPS * max(abs(value), scale)
-    padded = list(arguments) + [0.0] * (2 - len(arguments))
-    print(name, *[repr(float(a)) for a in padded], output, mpmath.nstr(value, 20), mpmath.nstr(bound, 3))
+from mpmath import mpf, pi, sqrt
+from reference import row, sides
 
 
 def wave(order, x):

@@ -1,0 +1,149 @@
+#include "qx/special_gamma.h"
+
+#include "special/tests/exports.h"
+
+#include <gtest/gtest.h>
+
+#include <cmath>
+
+namespace {
+
+using qx::test::kInfinity;
+using qx::test::kNaN;
+using qx::test::Whole;
+
+typedef const qx::test::Arguments &In;
+
+const qx::test::ExportMap &Exports() {
+    static const qx::test::ExportMap exports = {
+        {"Beta", [](In a, double *o) { QX_Beta(a[0], a[1], a[2], o); }},
+        {"BetaComplete", [](In a, double *o) { QX_Beta(a[0], a[1], kNaN, o); }},
+        {"Fact", [](In a, double *o) { QX_Fact(Whole(a[0]), o); }},
+        {"LnFact", [](In a, double *o) { QX_LnFact(Whole(a[0]), o); }},
+        {"GammaP", [](In a, double *o) { QX_Gamma(a[0], a[1], o); }},
+        {"GammaComplete", [](In a, double *o) { QX_Gamma(a[0], kNaN, o); }},
+        {"GammaC", [](In a, double *o) { QX_GammaC(a[0], a[1], o); }},
+        {"LnGamma", [](In a, double *o) { QX_LnGamma(a[0], o); }},
+        {"Stirling", [](In a, double *o) { QX_Stirling(a[0], o); }},
+        {"Psi", [](In a, double *o) { QX_Psi(a[0], o); }},
+    };
+    return exports;
+}
+
+double Value(const char *name, double a, double b = 0, double c = 0) {
+    return qx::test::Value(Exports(), name, {a, b, c});
+}
+
+TEST(SpecialGamma, AgreesWithReferencesOnBothSidesOfEachThreshold) {
+    EXPECT_GT(qx::test::ExpectAgreement(Exports(), QX_TEST_DATA "gamma.txt"), 200);
+}
+
+TEST(SpecialGamma, KeepsTheRulesOfDomainsAndLimits) {
+    const qx::test::Rule rules[] = {
+        {"Psi", {kInfinity}, kInfinity},
+        {"Psi", {-kInfinity}, kNaN},
+        {"Psi", {kNaN}, kNaN},
+        {"Psi", {0}, kInfinity},
+        {"Psi", {-0.0}, kInfinity},
+        {"Psi", {-7}, kInfinity},
+        {"Psi", {-1e300}, kInfinity},
+        {"Fact", {-1}, kNaN},
+        {"Fact", {0}, 1},
+        {"Fact", {171}, kInfinity},
+        {"Fact", {2147483647}, kInfinity},
+        {"LnFact", {-1}, kNaN},
+        {"LnFact", {-2147483648.0}, kNaN},
+        {"LnFact", {0}, 0},
+        {"LnFact", {1}, 0},
+        {"LnGamma", {-1e-300}, kNaN},
+        {"LnGamma", {0}, kInfinity},
+        {"LnGamma", {1}, 0},
+        {"LnGamma", {2}, 0},
+        {"LnGamma", {kInfinity}, kInfinity},
+        {"Stirling", {0}, kInfinity},
+        {"Stirling", {709.782712893384}, kInfinity},
+        {"Stirling", {kInfinity}, kInfinity},
+        {"Stirling", {-1}, kNaN},
+        {"GammaComplete", {0}, kNaN},
+        {"GammaComplete", {-5}, kNaN},
+        {"GammaComplete", {-40}, kNaN},
+        {"GammaComplete", {-kInfinity}, kNaN},
+        {"GammaComplete", {kNaN}, kNaN},
+        {"GammaComplete", {kInfinity}, kInfinity},
+        {"GammaComplete", {5}, 24},
+        {"GammaP", {2, kInfinity}, 1},
+        {"GammaP", {2, 0}, 0},
+        {"GammaP", {2, -1}, kNaN},
+        {"GammaP", {0, 1}, kNaN},
+        {"GammaP", {kInfinity, 1}, kInfinity},
+        {"GammaC", {2, kInfinity}, 0},
+        {"GammaC", {2, 0}, 1},
+        {"GammaC", {-2, 1}, kNaN},
+        {"GammaC", {2, kNaN}, kNaN}, // no selection by NaN here
+        {"BetaComplete", {kInfinity, 1}, kNaN},
+        {"BetaComplete", {1, -kInfinity}, kNaN},
+        {"BetaComplete", {kNaN, 1}, kNaN},
+        {"Beta", {1, 1, 0.3}, 0.3},
+        {"Beta", {2, 3, 0}, 0},
+        {"Beta", {2, 3, 1}, 1},
+        {"Beta", {-2, 3, 0.5}, kNaN},
+        {"Beta", {2, 3, 1.5}, kNaN},
+        {"Beta", {2, 3, kInfinity}, kNaN},
+    };
+    for (const auto &rule : rules)
+        qx::test::ExpectRule(Exports(), rule);
+}
+
+TEST(SpecialGamma, SelectsTheCompleteFormByNaNAndBySelector) {
+    double value = 0;
+    QX_Gamma_85(2.5, 1.5, &value, 1);
+    EXPECT_EQ(value, Value("GammaComplete", 2.5));
+    for (const int32_t selector : {0, 2, -1}) {
+        QX_Gamma_85(2.5, 1.5, &value, selector);
+        EXPECT_EQ(value, Value("GammaP", 2.5, 1.5));
+    }
+    QX_Gamma_85(2.5, kNaN, &value, 0); // here a NaN selects nothing
+    EXPECT_TRUE(std::isnan(value));
+
+    QX_Beta_85(2.5, 1.5, 0.25, &value, 1); // x is ignored
+    EXPECT_EQ(value, Value("BetaComplete", 2.5, 1.5));
+    QX_Beta_85(2.5, 1.5, 0.25, &value, 0);
+    EXPECT_EQ(value, Value("Beta", 2.5, 1.5, 0.25));
+    QX_Beta_85(2.5, 1.5, kNaN, &value, 0);
+    EXPECT_TRUE(std::isnan(value));
+}
+
+TEST(SpecialGamma, RecurrencesAndReflectionsHold) {
+    for (const double x : {0.01, 0.7, 3.3, 9.9, 17.2, 60.5}) {
+        EXPECT_NEAR(Value("Psi", x + 1), Value("Psi", x) + 1 / x, 1e-14 * (1 + 1 / x)) << x;
+        EXPECT_NEAR(Value("GammaP", x, 1.3 * x) + Value("GammaC", x, 1.3 * x), 1, 1e-15) << x;
+        EXPECT_NEAR(Value("BetaComplete", x, 2.5) * (x / (x + 2.5)), // B(a + 1, b)
+                    Value("BetaComplete", x + 1, 2.5), 1e-13 * Value("BetaComplete", x + 1, 2.5))
+            << x;
+        EXPECT_NEAR(Value("Beta", x, 2.5, 0.4) + Value("Beta", 2.5, x, 0.6), 1, 1e-13) << x;
+    }
+    for (int n = 1; n <= 33; ++n) // exact products, while 33! / 2^31 has 92 bits less than 53
+        EXPECT_NEAR(Value("Fact", n), n * Value("Fact", n - 1), 2.3e-16 * Value("Fact", n)) << n;
+}
+
+TEST(SpecialGamma, ReturnsSoonForAnyArgument) { qx::test::ExpectSoon(Exports(), 1000000); }
+
+TEST(SpecialGamma, LeavesNoStepAtAThreshold) {
+    const qx::test::Seam seams[] = {
+        {"Psi", {10}, 0, 1e-14},
+        {"Psi", {1e9}, 0, 1e-15},
+        {"LnGamma", {33}, 0, 1e-15},
+        {"LnGamma", {1000}, 0, 1e-15},
+        {"GammaComplete", {33}, 0, 1e-13},
+        {"GammaComplete", {-32.5}, 0, 1e-12},
+        {"Stirling", {143.01608}, 0, 1e-12},
+        {"GammaP", {0.5, 1}, 1, 1e-14},
+        {"GammaP", {7.5, 7.5}, 1, 1e-14},
+        {"GammaC", {7.5, 7.5}, 1, 1e-14},
+        {"Beta", {4, 2, 0.6666666666666666}, 2, 1e-14},
+    };
+    for (const auto &seam : seams)
+        qx::test::ExpectNoStep(Exports(), seam);
+}
+
+} // namespace
