@@ -22,14 +22,16 @@ EPS = 2.0**-52
 
 
 class Function:
-    """name: of the export. signature: letters of the arguments, d double, i int32, o an output, n a
-    null output. output: which of the outputs is measured. rows: (interval, list of argument
-    tuples). reference: of the arguments as mpf. peers: {"GSL": callable, ...} over floats."""
+    """name: of the export. signature: letters of the arguments, d double, i int32, D and I the same
+    by reference, o an output, e an error code, n a null output. output: which of the outputs is
+    measured. rows: (interval, list of argument tuples). reference: of the arguments as mpf. peers:
+    {"GSL": callable, ...} over floats. note: what the reader of the table must know."""
 
-    def __init__(self, name, signature, reference, rows, peers=None, scale=None, output=0, title=None):
+    def __init__(self, name, signature, reference, rows, peers=None, scale=None, output=0, title=None,
+                 note=""):
         self.name, self.signature, self.reference = name, signature, reference
         self.rows, self.peers, self.scale = rows, peers or {}, scale
-        self.output, self.title = output, title or name
+        self.output, self.title, self.note = output, title or name, note
 
 
 # Points. Each gives a list of floats, the ends included, and so both sides of a threshold where two
@@ -80,6 +82,12 @@ class Library:
                 passed.append(ctypes.c_double(values.pop(0)))
             elif letter == "i":
                 passed.append(ctypes.c_int32(int(values.pop(0))))
+            elif letter == "D":
+                passed.append(ctypes.byref(ctypes.c_double(values.pop(0))))
+            elif letter == "I":
+                passed.append(ctypes.byref(ctypes.c_int32(int(values.pop(0)))))
+            elif letter == "e":
+                passed.append(ctypes.byref(ctypes.c_int32()))
             elif letter == "n":
                 passed.append(None)
             else:
@@ -99,14 +107,14 @@ def plain(library, name, signature):
     """A peer's C function of doubles (d) and int32 (i), or None where the library lacks it."""
     if library is None or not hasattr(library, name):
         return None
-    types = {"d": ctypes.c_double, "i": ctypes.c_int32, "m": ctypes.c_uint}
+    types = {"d": ctypes.c_double, "i": ctypes.c_int32, "u": ctypes.c_uint32, "m": ctypes.c_uint}
     entry = getattr(library, name)
     entry.restype = ctypes.c_double
     entry.argtypes = [types[letter] for letter in signature]
     extra = [0] * signature.count("m")  # GSL's mode of precision
 
     def call(*arguments):
-        cast = [int(a) if t == "i" else float(a) for a, t in zip(arguments, signature.replace("m", ""))]
+        cast = [int(a) if t in "iu" else float(a) for a, t in zip(arguments, signature.replace("m", ""))]
         return entry(*cast, *extra)
     return call
 
@@ -179,7 +187,7 @@ PEERS = ("GSL", "C++", "SciPy")
 
 
 def table(function, library, verbose):
-    lines = [f"### {function.title}", "",
+    lines = [f"### {function.title}", ""] + ([function.note, ""] if function.note else []) + [
              "| Interval | Points | Peak | RMS | " + " | ".join(PEERS) + " |",
              "|---|--:|--:|--:|" + "--:|" * len(PEERS)]
     for interval, points in function.rows:
@@ -221,12 +229,15 @@ their peaks on the same points. Made by `tools/accuracy/run`.
 
 def main():
     library = Library(os.path.join(sys.argv[1], "libqxanalysis.so"))
-    chosen = sys.argv[2:]
+    chosen = [name for name in sys.argv[2:] if not name.endswith(".md")]
+    pages = [name for name in sys.argv[2:] if name.endswith(".md")]
     folder = os.path.dirname(os.path.abspath(__file__))
     sys.path.insert(0, folder)
     sys.modules["accuracy"] = sys.modules["__main__"]
     for path in sorted(glob.glob(os.path.join(folder, "*_points.py"))):
         module = importlib.import_module(os.path.basename(path)[:-3])
+        if pages and module.PAGE not in pages:
+            continue
         lines = [f"# {module.TITLE}", "", HEADING]
         for function in module.FUNCTIONS:
             if not chosen or function.name in chosen:

@@ -1,0 +1,117 @@
+"""Where the distributions and their quantiles are measured."""
+
+import mpmath
+from mpmath import mp, mpf
+
+from accuracy import Function, from_gsl, from_scipy, linear, logarithmic, product, single
+from gamma_points import lower_gamma, regularised_beta
+
+PAGE = "distributions.md"
+TITLE = "Accuracy: distributions"
+
+DOFS = [1, 2, 3, 5, 10, 30, 200]
+MANY = [1000, 30000]
+
+
+def normal(x):
+    return mpmath.erfc(-x / mpmath.sqrt(2)) / 2
+
+
+def student(t, dof):
+    tail = regularised_beta(dof / 2, mpf(1) / 2, dof / (t * t + dof)) / 2
+    return tail if t < 0 else 1 - tail
+
+
+def fisher(f, n, d):
+    return regularised_beta(n / 2, d / 2, f * n / (f * n + d))
+
+
+def chi_square(x, dof):
+    return lower_gamma(dof / 2, x / 2)
+
+
+def root(function, low, high):
+    """The increasing function's root between two numbers, to the digits of a double."""
+    low, high = mpf(low), mpf(high)
+    with mp.workdps(25):
+        for _ in range(400):
+            middle = (low + high) / 2
+            if function(middle) < 0:
+                low = middle
+            else:
+                high = middle
+            if high - low < mpf(2)**-20 * max(abs(middle), mpf("1e-30")):
+                break
+        return mpmath.findroot(function, (low, high), solver="anderson", tol=1e-35, verify=False)
+
+
+def normal_quantile(p):
+    if p > 0.5:
+        return -normal_quantile(1 - p)
+    return mpmath.findroot(lambda x: mpmath.log(normal(x) / p), -mpmath.sqrt(-2 * mpmath.log(p)))
+
+
+def student_quantile(p, dof):
+    return root(lambda t: student(t, dof) - p, -100, 100)
+
+
+def fisher_quantile(p, n, d):
+    return root(lambda f: fisher(f, n, d) - p, mpf("1e-12"), 10000)
+
+
+def chi_square_quantile(p, dof):
+    return root(lambda x: chi_square(x, dof) - p, mpf("1e-12"), 5000)
+
+
+def rows(name, points, dofs=DOFS, many=MANY):
+    return [(f"{name}, to {dofs[-1]} degrees", product(points, dofs)),
+            (f"{name}, {many[0]} and {many[-1]} degrees", product(points, many))]
+
+
+def two(points):
+    return [(x, n, d) for x, n in points for d in (1, 4, 40)]
+
+
+def peer(function, *order):
+    """A peer with its arguments in another order."""
+    return function and (lambda *a: function(*[a[k] for k in order]))
+
+
+TAILS = [-40.0, -12.5, -6.0, -3.3]
+PROBABILITIES = [1e-4, 0.01, 0.2, 0.45, 0.77, 0.95, 0.999]
+OF_X = {"GSL": from_gsl("gsl_cdf_ugaussian_P", "d"), "SciPy": from_scipy("ndtr")}
+LOW_PRECISION = "An approximation of low order, kept since results are compared across revisions; in absolute terms {}."
+BISECTION = "A bisection that stops at an absolute 1e-4, which is 4.5e11 eps; absolute where the value is below 1."
+
+FUNCTIONS = [
+    Function("NormDist_head", "Do", normal, [("[-8, 0]", single(linear(-8, 0))), ("[0, 8]", single(linear(0, 8)))],
+             OF_X, 1, note=LOW_PRECISION.format("the error is 1e-5, or 4.5e10 eps")),
+    Function("TDist_head", "DIoe", student,
+             rows("t in [-40, -3]", TAILS) + rows("|t| in [0.001, 3]", linear(-3, 3, 8) + [-1e-3]) +
+             [("|t| = 1e-6", product([-1e-6, 1e-6], DOFS))],
+             {"GSL": from_gsl("gsl_cdf_tdist_P", "dd"), "SciPy": peer(from_scipy("stdtr"), 1, 0)},
+             note="From dof / (t^2 + dof), which nears 1 for small t and loses the digits of t^2."),
+    Function("FDist_head", "DIIoe", fisher,
+             [(t, two(p)) for t, p in rows("f in [0.01, 1]", logarithmic(0.01, 1, 6)) +
+              rows("f in [1, 50]", logarithmic(1, 50, 6))],
+             {"GSL": from_gsl("gsl_cdf_fdist_P", "ddd"), "SciPy": peer(from_scipy("fdtr"), 1, 2, 0)},
+             note="1 less the upper tail: small probabilities have the absolute error of those near 1."),
+    Function("ChiSquare_head", "DIoe", chi_square,
+             [(t, [(x * d, d) for x, d in p]) for t, p in rows("x in [0.1, 0.8] dof", [0.1, 0.3, 0.5, 0.8]) +
+              rows("x in [0.8, 1.2] dof", [0.9, 0.99, 1.0, 1.01, 1.1]) + rows("x in [1.2, 5] dof", [1.2, 2, 5])],
+             {"GSL": from_gsl("gsl_cdf_chisq_P", "dd"), "SciPy": peer(from_scipy("chdtr"), 1, 0)}),
+    Function("InvNdist_head", "Doe", normal_quantile,
+             [("p in [1e-300, 0.5]", single(logarithmic(1e-300, 0.5))), ("p in [0.5, 1)", single(linear(0.5, 1 - 1e-9)))],
+             {"GSL": from_gsl("gsl_cdf_ugaussian_Pinv", "d"), "SciPy": from_scipy("ndtri")}, 1,
+             note=LOW_PRECISION.format("the error is 4.5e-4, or 2e12 eps")),
+    Function("InvTdist_head", "DIoe", student_quantile, rows("p in [1e-4, 0.999]", PROBABILITIES, DOFS[1:]),
+             {"GSL": from_gsl("gsl_cdf_tdist_Pinv", "dd"), "SciPy": peer(from_scipy("stdtrit"), 1, 0)}, 1,
+             note=BISECTION),
+    Function("InvFDist_head", "DIIoe", fisher_quantile,
+             [(t, [(p, n, 9) for p, n in q]) for t, q in rows("p in [1e-4, 0.999]", PROBABILITIES)],
+             {"GSL": from_gsl("gsl_cdf_fdist_Pinv", "ddd"), "SciPy": peer(from_scipy("fdtri"), 1, 2, 0)}, 1,
+             note=BISECTION),
+    Function("InvChiSquare_head", "DIoe", chi_square_quantile, rows("p in [1e-4, 0.999]", PROBABILITIES, DOFS, [1000, 3000]),
+             {"GSL": from_gsl("gsl_cdf_chisq_Pinv", "dd"),
+              "SciPy": lambda p, dof: 2 * from_scipy("gammaincinv")(dof / 2, p)}, 1, note=BISECTION),
+]
