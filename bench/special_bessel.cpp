@@ -1,4 +1,4 @@
-#include "bench/special_rows.h"
+#include "bench/special_peers.h"
 
 #include "special/airy.h"
 #include "special/bessel_integer.h"
@@ -12,11 +12,7 @@
 
 #include <cmath>
 
-#ifdef QX_PEER_GSL
-#include <gsl/gsl_sf.h>
-#endif
-#if __has_include(<boost/math/special_functions/bessel.hpp>)
-#define QX_PEER_BOOST
+#ifdef QX_PEER_BOOST
 #include <boost/math/special_functions/airy.hpp>
 #include <boost/math/special_functions/bessel.hpp>
 #include <boost/math/special_functions/ellint_1.hpp>
@@ -26,51 +22,6 @@
 #endif
 
 namespace qx::bench {
-
-namespace {
-
-typedef std::vector<std::pair<const char *, SpecialRow::Function>> Peers;
-
-// The peers in the order GSL, C++ library, Boost; null where one lacks the function.
-Peers Of(SpecialRow::Function gsl, SpecialRow::Function standard, SpecialRow::Function boost) {
-    Peers peers;
-    if (gsl != nullptr)
-        peers.push_back({"GSL", gsl});
-    if (standard != nullptr)
-        peers.push_back({"C++", standard});
-    if (boost != nullptr)
-        peers.push_back({"Boost", boost});
-    return peers;
-}
-
-#ifdef QX_PEER_GSL
-#define QX_GSL(expression)                                                                         \
-    [](double a, double b) -> double {                                                             \
-        (void)a;                                                                                   \
-        (void)b;                                                                                   \
-        return expression;                                                                         \
-    }
-#else
-#define QX_GSL(expression) nullptr
-#endif
-#ifdef QX_PEER_BOOST
-#define QX_BOOST(expression)                                                                       \
-    [](double a, double b) -> double {                                                             \
-        (void)a;                                                                                   \
-        (void)b;                                                                                   \
-        return expression;                                                                         \
-    }
-#else
-#define QX_BOOST(expression) nullptr
-#endif
-#define QX_CALL(expression)                                                                        \
-    [](double a, double b) -> double {                                                             \
-        (void)a;                                                                                   \
-        (void)b;                                                                                   \
-        return expression;                                                                         \
-    }
-
-} // namespace
 
 std::vector<SpecialRow> SpecialBesselRows() {
     return {
