@@ -6,5 +6,6 @@
 
 #include "qx/special_bessel.h"
 #include "qx/special_gamma.h"
+#include "qx/special_integrals.h"
 
 #endif

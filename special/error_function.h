@@ -1,0 +1,14 @@
+#ifndef QX_SPECIAL_ERROR_FUNCTION_H
+#define QX_SPECIAL_ERROR_FUNCTION_H
+
+namespace qx {
+
+// erf(x), 2 / sqrt(pi) times the integral of exp(-t^2) from 0 to x, and erfc(x) = 1 - erf(x): each
+// in its own form where it is the smaller, up to |x| = 1 and beyond, with the rational
+// approximations of special/tables/error_function.h.
+double Erf(double x);
+double ErfC(double x);
+
+} // namespace qx
+
+#endif
