@@ -16,6 +16,7 @@ constexpr double kNaN = std::numeric_limits<double>::quiet_NaN();
 constexpr double kSqrtTwoPi = 2.5066282746310007;
 constexpr double kStirlingFrom = 10;
 constexpr double kTiny = 1e-20;
+constexpr double kGammasTo = 33;
 constexpr double kHuge = 1e12;
 
 // ln gamma(x) - ((x - 1/2) ln x - x + ln sqrt(2 pi)), x >= 10, to full precision of its sum with 1.
@@ -60,10 +61,22 @@ double ByStirling(double a, double b) {
            PowerOfShare(q, s) * std::exp(correction);
 }
 
+// 1e-20 < b <= a, a + b <= 33. A third of the time that Stirling's formula takes after it has
+// moved both arguments up, for an eps or two more.
+double ByGammas(double a, double b) {
+    const Extended s = ExactSum(a, b);
+    double value = GammaFunction(a) / GammaFunction(s.high) * GammaFunction(b);
+    if (s.high > 2) // the rounding of the sum, times the digamma function of it
+        value -= value * (s.low * (std::log(s.high) - 0.5 / s.high));
+    return value;
+}
+
 // 0 < b <= a.
 double OfPositive(double a, double b) {
     if (b < kTiny)
         return 1 / a + 1 / b;
+    if (a + b <= kGammasTo)
+        return ByGammas(a, b);
     if (a <= kHuge)
         return ByStirling(a, b);
     if (b > 40)

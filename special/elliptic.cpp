@@ -158,7 +158,8 @@ JacobiValues ByMeans(double u, double m) {
     double b = std::sqrt(1 - m);
     double scale = 1;
     int i = 0;
-    while (i < rounds && std::fabs(c[i] / a[i]) > kEps) {
+    // eps a is exact, and so c / a, rounded, exceeds eps where c exceeds eps a
+    while (i < rounds && std::fabs(c[i]) > kEps * a[i]) {
         a[i + 1] = 0.5 * (a[i] + b);
         c[i + 1] = 0.5 * (a[i] - b);
         b = std::sqrt(a[i] * b);
@@ -166,6 +167,10 @@ JacobiValues ByMeans(double u, double m) {
         ++i;
     }
     double phi = scale * a[i] * u;
+    if (i > 0 && std::fabs(phi) >= 4 && std::fabs(c[i]) <= kEps * a[i]) {
+        phi *= 0.5; // the last arc sine is below half a unit in the last place of phi
+        --i;
+    }
     for (; i > 0; --i) {
         const double sine = c[i] * std::sin(phi) / a[i];
         // a small arc sine is its argument to the last bit

@@ -3,6 +3,8 @@
 #include "special/extended.h"
 #include "stats/gamma.h"
 
+#include <array>
+#include <cstddef>
 #include <limits>
 
 namespace qx {
@@ -10,8 +12,10 @@ namespace qx {
 namespace {
 
 constexpr double kNaN = std::numeric_limits<double>::quiet_NaN();
+constexpr double kInfinity = std::numeric_limits<double>::infinity();
 constexpr int32_t kLastInTable = 33;
 constexpr int32_t kLastProduct = 50;
+constexpr int32_t kLastFinite = 170;
 
 constexpr double kTable[] = {1.,
                              1.,
@@ -52,19 +56,27 @@ static_assert(sizeof kTable / sizeof kTable[0] == kLastInTable + 1);
 // What the double of 33! leaves off; the sum of both is exact.
 constexpr double kRestOfLast = 5.568025205059617e+20;
 
+// Formed once, since a look-up is a fifth of the time of gamma.
+std::array<double, kLastFinite + 1> AllFinite() {
+    std::array<double, kLastFinite + 1> values;
+    Extended product = {kTable[kLastInTable], kRestOfLast};
+    for (int32_t n = 0; n <= kLastFinite; ++n) {
+        if (n > kLastInTable && n <= kLastProduct)
+            product = product * Extended{static_cast<double>(n), 0};
+        values[static_cast<std::size_t>(n)] = n <= kLastInTable   ? kTable[n]
+                                              : n <= kLastProduct ? product.high
+                                                                  : GammaFunction(n + 1.0);
+    }
+    return values;
+}
+
 } // namespace
 
 double Factorial(int32_t n) {
     if (n < 0)
         return kNaN;
-    if (n <= kLastInTable)
-        return kTable[n];
-    if (n > kLastProduct)
-        return GammaFunction(n + 1.0);
-    Extended product = {kTable[kLastInTable], kRestOfLast};
-    for (int32_t k = kLastInTable + 1; k <= n; ++k)
-        product = product * Extended{static_cast<double>(k), 0};
-    return product.high;
+    static const std::array<double, kLastFinite + 1> values = AllFinite();
+    return n <= kLastFinite ? values[static_cast<std::size_t>(n)] : kInfinity;
 }
 
 double LnFactorial(int32_t n) {
