@@ -59,9 +59,6 @@ double ContinuedFraction(double x, double n) {
 }
 
 double PowerSeries(double x, int32_t n) {
-    double psi = -kEuler - std::log(x);
-    for (int32_t k = 1; k < n; ++k)
-        psi += 1.0 / k;
     double k = 0;
     double term = 1;
     double p = 1.0 - n;
@@ -75,6 +72,9 @@ double PowerSeries(double x, int32_t n) {
     } while (sum == 0 || std::fabs(term / sum) > kEps);
     if (n >= kWithoutLogarithm)
         return -sum; // kept: the first term no longer counts
+    double psi = -kEuler - std::log(x);
+    for (int32_t i = 1; i < n; ++i)
+        psi += 1.0 / i;
     return std::pow(-x, n - 1) * psi / GammaFunction(n) - sum;
 }
 

@@ -19,12 +19,12 @@ QX_API void QX_ErfC(double x, QX_OUT DBL *value);
 
 /** Exponential integral E_n(x), the integral of exp(-x t) / t^n from 1 to infinity: the expansion
     5.1.52 for n > 5000, the continued fraction 5.1.22 for x > 1, the power series 5.1.12 below,
-   from n = 170 on without its logarithmic term. NaN for n < 0, x < 0 and infinities; 0 for x >
-   709.78; at x = 0 it is 1 / (n - 1), or +infinity for n = 0 and 1. */
+    from n = 170 on without its logarithmic term. NaN for n < 0, x < 0 and infinities; 0 for x >
+    709.78; at x = 0 it is 1 / (n - 1), or +infinity for n = 0 and 1. */
 QX_API void QX_ExpI(double x, int32_t n, QX_OUT DBL *value);
 
 /** Sine integral Si(x), the integral of sin(t) / t from 0 to x: a rational function up to |x| = 4,
-   the auxiliary functions of 5.2.8 beyond. -pi / 2 and pi / 2 at the infinities. */
+    the auxiliary functions of 5.2.8 beyond. -pi / 2 and pi / 2 at the infinities. */
 QX_API void QX_SinI(double x, QX_OUT DBL *value);
 
 /** Cosine integral Ci(x) = gamma + ln |x| + the integral of (cos(t) - 1) / t from 0 to |x|, by the
@@ -40,7 +40,7 @@ QX_API void QX_SinhI(double x, QX_OUT DBL *value);
 QX_API void QX_CoshI(double x, QX_OUT DBL *value);
 
 /** Dilogarithm Li2(1 - x), minus the integral of ln(t) / (t - 1) from 1 to x: a rational function
-   on [0.5, 1.5], the reflections 27.7.3 and 27.7.5 outside. NaN for x < 0; pi^2 / 6 at 0, 0 at 1,
+    on [0.5, 1.5], the reflections 27.7.3 and 27.7.5 outside. NaN for x < 0; pi^2 / 6 at 0, 0 at 1,
     -infinity at +infinity. */
 QX_API void QX_Diln(double x, QX_OUT DBL *value);
 

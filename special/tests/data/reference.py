@@ -18,7 +18,7 @@ def row(name, arguments, output, value, tolerance, scale=0):
     """NAME ARGUMENT ... OUTPUT VALUE BOUND; the bound is absolute: so many eps of the value or,
     where that is larger, of a scale. What a double cannot hold is left out."""
     value = mpmath.re(value)
-    if value != 0 and not 1e-290 < abs(value) < 1e300:
+    if value != 0 and not 1e-290 < abs(value) < 1e308:
         return
     bound = tolerance * EPS * max(abs(value), scale)
     print(name, *[repr(float(a)) for a in arguments], output, mpmath.nstr(value, 20), mpmath.nstr(bound, 3))
