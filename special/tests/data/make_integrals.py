@@ -11,7 +11,7 @@ def exponential(n, x):
     if x <= 1 or n == 0:
         return mpmath.expint(n, x)
     tail = mpf(0)
-    for k in range(4000, 0, -1):
+    for k in range(1000, 0, -1):
         tail = k * (n + k - 1) / (x + n + 2 * k - tail)
     return mpmath.exp(-x) / (x + n - tail)
 
