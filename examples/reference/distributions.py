@@ -1,5 +1,6 @@
 import numpy as np
 import qx
+from qx.plots import curves
 
 #%% Probabilities and quantiles
 print("P(T <= 2.5), 9 degrees of freedom ", qx.call("TDist_head", 2.5, 9))
@@ -7,12 +8,19 @@ print("quantile of that probability      ", qx.call("InvTdist_head", qx.call("TD
 print("chi-square, 95 % point, 4 degrees ", qx.call("InvChiSquare_head", 0.95, 4))
 
 #%% Student's distribution nears the normal one
-import matplotlib.pyplot as plt  # hidden
 t = np.linspace(-4, 4, 200)
-curves = {f"{dof} degrees": qx.call("TDist_head", t, dof) for dof in (1, 3, 10)}
-curves["normal"] = qx.call("NormDist_head", t)
-figure, axes = plt.subplots(figsize=(8, 2.8))  # hidden
-for name, p in curves.items():  # hidden
-    axes.plot(t, p, label=name)  # hidden
-axes.legend(frameon=False)  # hidden
-axes.set(xlabel="t", ylabel="Probability")  # hidden
+curves(t, {**{f"dof {dof}": qx.call("TDist_head", t, dof) for dof in (1, 3, 10)},
+           "normal": qx.call("NormDist_head", t)}, xlabel="t")
+
+#%% Chi-square and Fisher's distribution
+x = np.linspace(0, 20, 300)
+curves(x, {f"dof {dof}": qx.call("ChiSquare_head", x, dof) for dof in (1, 2, 5, 10)},
+       xlabel="chi-square")
+f = np.linspace(0, 5, 300)
+curves(f, {f"dof {n}, {d}": qx.call("FDist_head", f, n, d) for n, d in ((1, 4), (5, 4), (10, 40))},
+       xlabel="F")
+
+#%% Quantiles
+p = np.linspace(0.005, 0.995, 200)
+curves(p, {"normal": qx.call("InvNdist_head", p), "t, dof 3": qx.call("InvTdist_head", p, 3),
+           "chi-square, dof 2": qx.call("InvChiSquare_head", p, 2)}, (-4, 9), "p")

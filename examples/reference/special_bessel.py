@@ -1,66 +1,51 @@
-import matplotlib.pyplot as plt
 import numpy as np
 import qx
-
-
-def plot(x, curves, ylim=None, xlabel="x"):
-    """One plot of several named curves."""
-    figure, axes = plt.subplots(figsize=(8, 2.8))
-    for name, y in curves.items():
-        y = np.asarray(y, float).copy()
-        if ylim:
-            y[(y < 3 * ylim[0]) | (y > 3 * ylim[1])] = np.nan  # poles stay open
-            axes.set_ylim(*ylim)
-        axes.plot(x, y, label=name, linewidth=1.2)
-    axes.axhline(0, color="#8795a6", linewidth=0.6)
-    axes.set_xlabel(xlabel)
-    axes.legend(frameon=False, fontsize=8, loc="upper left", bbox_to_anchor=(1.0, 1.0))
-
+from qx.plots import curves
 
 #%% Bessel functions of real order
 x = np.linspace(0.01, 20, 500)
-plot(x, {**{f"J {v}": qx.call("QX_BesselJr", v, x) for v in (0, 0.5, 2.5)},
-         **{f"Y {v}": qx.call("QX_BesselYr", v, x) for v in (0, 2.5)}}, (-1.1, 1.1))
+curves(x, {**{f"J {v}": qx.call("QX_BesselJr", v, x) for v in (0, 0.5, 2.5)},
+           **{f"Y {v}": qx.call("QX_BesselYr", v, x) for v in (0, 2.5)}}, (-1.1, 1.1))
 
 #%% Modified Bessel functions
 x = np.linspace(0.01, 4, 300)
-plot(x, {**{f"I {v}": qx.call("QX_BesselIr", v, x) for v in (0, 1, 2.5)},
-         **{f"K {n}": qx.call("QX_BesselKn", n, x) for n in (0, 1, 2)}}, (0, 5))
+curves(x, {**{f"I {v}": qx.call("QX_BesselIr", v, x) for v in (0, 1, 2.5)},
+           **{f"K {n}": qx.call("QX_BesselKn", n, x) for n in (0, 1, 2)}}, (0, 5))
 
 #%% Spherical Bessel functions
 x = np.linspace(0.05, 20, 500)
-plot(x, {**{f"j {n}": qx.call("QX_BesselJs", n, x) for n in (0, 1, 2)},
-         **{f"y {n}": qx.call("QX_BesselYs", n, x) for n in (0, 1)}}, (-0.6, 1.05))
+curves(x, {**{f"j {n}": qx.call("QX_BesselJs", n, x) for n in (0, 1, 2)},
+           **{f"y {n}": qx.call("QX_BesselYs", n, x) for n in (0, 1)}}, (-0.6, 1.05))
 
 #%% Airy functions and their derivatives
 x = np.linspace(-10, 3, 500)
-plot(x, dict(zip(("Ai", "Ai'", "Bi", "Bi'"), qx.call("QX_Airy", x))), (-1.2, 2.0))
+curves(x, dict(zip(("Ai", "Ai'", "Bi", "Bi'"), qx.call("QX_Airy", x))), (-1.2, 2.0))
 
 #%% Kelvin functions of order 0
 x = np.linspace(0.01, 7, 300)
-plot(x, dict(zip(("ber", "bei", "ker", "kei"),
-                 (*qx.call("QX_KelvinI", x, 0), *qx.call("QX_KelvinK", x, 0)))), (-6, 6))
+curves(x, dict(zip(("ber", "bei", "ker", "kei"),
+                   (*qx.call("QX_KelvinI", x, 0), *qx.call("QX_KelvinK", x, 0)))), (-6, 6))
 
 #%% Struve functions
 x = np.linspace(0.01, 20, 400)
-plot(x, {f"H {v}": qx.call("QX_Struve", x, v) for v in (0.0, 1.0, 2.0)})
+curves(x, {f"H {v}": qx.call("QX_Struve", x, v) for v in (0.0, 1.0, 2.0)})
 
 #%% Parabolic cylinder functions
 x = np.linspace(-5, 5, 400)
-plot(x, {f"D {v}": qx.call("QX_ParabolicCylinder", x, v) for v in (0.0, 1.0, 2.0, 3.5)}, (-4, 6))
+curves(x, {f"D {v}": qx.call("QX_ParabolicCylinder", x, v) for v in (0.0, 1.0, 2.0, 3.5)}, (-4, 6))
 
 #%% Elliptic integrals and the Jacobian functions
 m = np.linspace(0, 0.999, 300)
-plot(m, {"K(m)": qx.call("QX_Elliptic1", m, np.nan), "E(m)": qx.call("QX_Elliptic2", m, np.nan)},
-     xlabel="m")
+curves(m, {"K(m)": qx.call("QX_Elliptic1", m, np.nan), "E(m)": qx.call("QX_Elliptic2", m, np.nan)},
+       xlabel="m")
 u = np.linspace(-8, 8, 500)
-plot(u, dict(zip(("sn", "cn", "dn", "amplitude"), qx.call("QX_EllipticJ", u, 0.9))), (-2, 2), "u")
+curves(u, dict(zip(("sn", "cn", "dn", "amplitude"), qx.call("QX_EllipticJ", u, 0.9))), (-2, 2), "u")
 
 #%% Dawson's integral and the Fresnel integrals
 x = np.linspace(-6, 6, 600)
 c, s = qx.call("QX_FresnelIntegrals", x)
-plot(x, {"Dawson": qx.call("QX_Dawson", x), "Fresnel C": c, "Fresnel S": s})
+curves(x, {"Dawson": qx.call("QX_Dawson", x), "Fresnel C": c, "Fresnel S": s})
 
 #%% Riemann's zeta function
 x = np.linspace(-14, 6, 600)
-plot(x, {"zeta": qx.call("QX_Zeta", x)}, (-1.5, 3))
+curves(x, {"zeta": qx.call("QX_Zeta", x)}, (-1.5, 3))
