@@ -56,7 +56,7 @@ static_assert(sizeof kTable / sizeof kTable[0] == kLastInTable + 1);
 // What the double of 33! leaves off; the sum of both is exact.
 constexpr double kRestOfLast = 5.568025205059617e+20;
 
-// Formed once, since a look-up is a fifth of the time of gamma.
+// A look-up is a fifth of the time of gamma.
 std::array<double, kLastFinite + 1> AllFinite() {
     std::array<double, kLastFinite + 1> values;
     Extended product = {kTable[kLastInTable], kRestOfLast};
@@ -70,13 +70,15 @@ std::array<double, kLastFinite + 1> AllFinite() {
     return values;
 }
 
+// Formed when the module is loaded: a local static would take the compiler's guard in each call.
+const std::array<double, kLastFinite + 1> kValues = AllFinite();
+
 } // namespace
 
 double Factorial(int32_t n) {
     if (n < 0)
         return kNaN;
-    static const std::array<double, kLastFinite + 1> values = AllFinite();
-    return n <= kLastFinite ? values[static_cast<std::size_t>(n)] : kInfinity;
+    return n <= kLastFinite ? kValues[static_cast<std::size_t>(n)] : kInfinity;
 }
 
 double LnFactorial(int32_t n) {
