@@ -2,21 +2,28 @@
 #define QX_SPECIAL_BESSEL_H
 
 /* Bessel functions and their kin, elliptic integrals and functions, Dawson, Fresnel, zeta. NaN in
-   gives NaN. docs/accuracy has the measured errors. */
+   gives NaN. docs/accuracy has the measured errors. The numbers of formulas are those of
+   M. Abramowitz and I. A. Stegun, Handbook of mathematical functions, 1964. */
 
 #include "qx/types.h"
 
 QX_BEGIN_DECLS
 
-/** Airy functions Ai(x), Ai'(x), Bi(x), Bi'(x). For x > 103.892 the first two are 0 and the last
+/** Airy functions Ai(x), Ai'(x), Bi(x), Bi'(x), the solutions of w'' = x w (10.4): Maclaurin
+    series for |x| <= 2.09, and of Bi up to 8.32; modulus and phase or exponentials with rational
+    corrections in zeta = 2 |x|^(3/2) / 3 beyond. For x > 103.892 the first two are 0 and the last
     two the largest finite double. */
 QX_API void QX_Airy(double x, QX_OUT DBL *ai, QX_OUT DBL *aip, QX_OUT DBL *bi, QX_OUT DBL *bip);
 
-/** Bessel function J of real order. NaN for orders below -200 and for x < 0 unless the order is
-    an integer; 0 for |x| < 2.2e-16 and orders that are not integers. */
+/** Bessel function J of real order, a solution of x^2 w'' + x w' + (x^2 - order^2) w = 0 (9.1):
+    the ascending series, Hankel's form and recurrence in the order; rational kernels for orders 0
+    and 1; for orders from 200 on the expansion for large order. NaN for orders below -200 and for
+    x < 0 unless the order is an integer; 0 for |x| < 2.2e-16 and orders that are not integers. */
 QX_API void QX_BesselJr(double order, double x, QX_OUT DBL *value);
 
-/** Bessel function Y of real order. NaN for x <= 0 and for orders below -200. */
+/** Bessel function Y of real order: kernels and upward recurrence for integers, otherwise
+    (cos(order pi) J_order(x) - J_-order(x)) / sin(order pi) (9.1.2), which loses digits close to
+    integers. NaN for x <= 0 and for orders below -200. */
 QX_API void QX_BesselYr(double order, double x, QX_OUT DBL *value);
 
 /** Spherical Bessel function j_n(x) = sqrt(pi / (2 x)) J_(n+1/2)(x). NaN for x < 0; 0 at
@@ -27,54 +34,71 @@ QX_API void QX_BesselJs(int32_t n, double x, QX_OUT DBL *value);
     0; 0 at +infinity. */
 QX_API void QX_BesselYs(int32_t n, double x, QX_OUT DBL *value);
 
-/** Modified Bessel function I of real order. NaN for orders below -200 and for x < 0 unless the
-    order is an integer; at 0 with a negative order an infinity of the sign of gamma(order + 1). */
+/** Modified Bessel function I of real order, (x/2)^v exp(-x) M(v + 1/2, 2 v + 1, 2 x) / gamma(v +
+    1) (9.6.47), for integers by rational kernels and recurrence. NaN for orders below -200 and
+    for x < 0 unless the order is an integer; at 0 with a negative order an infinity of the sign
+    of gamma(order + 1). */
 QX_API void QX_BesselIr(double order, double x, QX_OUT DBL *value);
 
-/** Modified Bessel function K of order |n|. NaN for x < 0; +infinity at 0; 0 at +infinity. */
+/** Modified Bessel function K of order |n|, upward from K_0 and K_1 by K_(k+1) = K_(k-1) + 2 k
+    K_k / x (9.6.26). NaN for x < 0; +infinity at 0; 0 at +infinity. */
 QX_API void QX_BesselKn(int32_t n, double x, QX_OUT DBL *value);
 
-/** Kelvin functions ber and bei of order n, ber + i bei = J_n(x exp(3 pi i / 4)). NaN for
+/** Kelvin functions ber and bei of order n, ber + i bei = J_n(x exp(3 pi i / 4)) (9.9.1). NaN for
     infinite x. */
 QX_API void QX_KelvinI(double x, int32_t n, QX_OUT DBL *ber, QX_OUT DBL *bei);
 
-/** Kelvin functions ker and kei of order n, ker + i kei = i^-n K_n(x exp(i pi / 4)). NaN for
-    x <= 0. */
+/** Kelvin functions ker and kei of order n, ker + i kei = i^-n K_n(x exp(i pi / 4)) (9.9.2). NaN
+    for x <= 0. Source of the method beyond x = 2: N. M. Temme, On the numerical evaluation of the
+    modified Bessel function of the third kind, 1975. */
 QX_API void QX_KelvinK(double x, int32_t n, QX_OUT DBL *ker, QX_OUT DBL *kei);
 
-/** Struve function H of order v. NaN for infinities, for x = 0 with v < 0, and for x < 0 unless
-    the order is an integer. */
+/** Struve function H of order v: the ascending series (12.1.3) or the asymptotic one added to Y_v
+    (12.1.29), whichever has the smaller estimate of its error. NaN for infinities, for x = 0 with
+    v < 0, and for x < 0 unless the order is an integer. */
 QX_API void QX_Struve(double x, double v, QX_OUT DBL *value);
 
-/** Parabolic cylinder function D of order v. 0 at +infinity; NaN for infinite v. */
+/** Parabolic cylinder function D of order v, the solution of w'' = (x^2 / 4 - v - 1 / 2) w that
+    vanishes at +infinity (19.3.7): the asymptotic series (19.8.1), the two series at 0 (19.2.1,
+    19.2.3) and recurrence in the order (19.6.4). 0 at +infinity; NaN for infinite v. */
 QX_API void QX_ParabolicCylinder(double x, double v, QX_OUT DBL *value);
 
-/** Elliptic integral of the first kind by its parameter m = k^2: complete, K(m), where phi is NaN,
-    else F(phi, m). NaN for m outside [0, 1]. */
+/** Elliptic integral of the first kind by its parameter m = k^2: complete, K(m) = F(pi / 2, m),
+    where phi is NaN, else F(phi, m), the integral of (1 - m sin^2(t))^(-1/2) from 0 to phi
+    (17.2). Complete by a rational form and the logarithm of 1 - m, incomplete by Landen's
+    descending transformation (17.6.8). NaN for m outside [0, 1]. */
 QX_API void QX_Elliptic1(double m, double phi, QX_OUT DBL *value);
 
 /** The same with a selector for what a NaN says above: 1 complete, otherwise incomplete. */
 QX_API void QX_Elliptic1_85(double m, double phi, QX_OUT DBL *value, int32_t selector);
 
-/** Elliptic integral of the second kind: complete, E(m), where phi is NaN, else E(phi, m). NaN for
-    m outside [0, 1]. */
+/** Elliptic integral of the second kind: complete, E(m), where phi is NaN, else E(phi, m), the
+    integral of (1 - m sin^2(t))^(1/2) from 0 to phi, by the same methods. NaN for m outside [0,
+    1]. */
 QX_API void QX_Elliptic2(double m, double phi, QX_OUT DBL *value);
 
 /** The same with a selector for what a NaN says above: 1 complete, otherwise incomplete. */
 QX_API void QX_Elliptic2_85(double m, double phi, QX_OUT DBL *value, int32_t selector);
 
-/** Jacobian elliptic functions sn, cn, dn of u with parameter m, and the amplitude. Each pointer
-    may be null. NaN for m outside [0, 1]. */
+/** Jacobian elliptic functions sn = sin(phi), cn = cos(phi), dn = (1 - m sn^2)^(1/2) of u with
+    parameter m, and the amplitude phi, for which F(phi, m) = u: by arithmetic-geometric means
+    (16.4), next to m = 0 and m = 1 by circular and hyperbolic functions (16.13, 16.15). Each
+    pointer may be null. NaN for m outside [0, 1]. */
 QX_API void QX_EllipticJ(double u, double m, QX_OUT DBL *sn, QX_OUT DBL *cn, QX_OUT DBL *dn,
                          QX_OUT DBL *phi);
 
-/** Dawson's integral, exp(-x^2) times the integral of exp(t^2) from 0 to x. NaN for infinities. */
+/** Dawson's integral, exp(-x^2) times the integral of exp(t^2) from 0 to x, by rational functions
+    of x^2 up to |x| = 3.25, of 1 / x^2 beyond. NaN for infinities. */
 QX_API void QX_Dawson(double x, QX_OUT DBL *value);
 
-/** Fresnel integrals: of cos(pi t^2 / 2) and sin(pi t^2 / 2) from 0 to x. */
+/** Fresnel integrals C(x) and S(x): of cos(pi t^2 / 2) and sin(pi t^2 / 2) from 0 to x (7.3.1,
+    7.3.2), by rational functions of x^4 up to |x| = 1.6, by the auxiliary functions (7.3.9,
+    7.3.10) beyond. -1/2 and 1/2 at the infinities. */
 QX_API void QX_FresnelIntegrals(double x, QX_OUT DBL *c, QX_OUT DBL *s);
 
-/** Riemann's zeta function. NaN for x < -30.8148; +infinity at 1 and at +infinity. */
+/** Riemann's zeta function, the sum of k^-x for x > 1 (23.2.1) and its continuation: rational
+    forms up to x = 50, the sum over odd k (23.2.20) beyond, the reflection (23.2.6) for x < 0.
+    NaN for x < -30.8148; +infinity at 1 and at +infinity. */
 QX_API void QX_Zeta(double x, QX_OUT DBL *value);
 
 QX_END_DECLS
