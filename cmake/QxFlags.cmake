@@ -7,9 +7,6 @@ target_compile_options(qxflags INTERFACE -ffp-contract=off -fno-math-errno -fvis
 # vectors wider than the registers pass between functions of one build only.
 target_compile_options(qxflags INTERFACE $<$<COMPILE_LANGUAGE:CXX>:-Wno-ignored-attributes> -Wno-psabi)
 
-# Four lanes without AVX are passed in another way than with it; all of frame/lanes.h is inlined.
-target_compile_options(qxflags INTERFACE -Wno-psabi)
-
 # A constant argument must meet the module's own mathematics library, not the compiler's.
 foreach(function IN ITEMS sin cos tan asin acos atan atan2 sinh cosh tanh exp exp2 expm1 log log2
         log10 log1p pow cbrt hypot fmod)

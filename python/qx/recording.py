@@ -17,6 +17,9 @@ class InputError(Exception):
     """What is wrong with an input, with file and line."""
 
 
+WIDEST = 1e307  # with the margins of a plot still a double
+
+
 @dataclasses.dataclass
 class Recording:
     name: str  # of the file, without its folder
@@ -74,6 +77,9 @@ def read(path, rate=None, column=None):
         recording = _wav(path, data, column)
     else:
         recording = _table(path, _text(path, data), column)
+    lowest, highest = float(recording.values.min()), float(recording.values.max())
+    if highest - lowest > WIDEST:
+        raise InputError(f"{path}: from {lowest:g} to {highest:g} is more than a plot can span")
     if rate is not None:
         recording.rate, recording.rate_source = rate, "given on the command line"
     elif recording.rate is None:
@@ -224,7 +230,8 @@ def _time_unit(name):
 
 
 def _wav(path, data, column):
-    """Uncompressed WAV files: integers of 8 to 32 bits, floats of 32 and 64."""
+    """Uncompressed WAV files: integers of 8 to 32 bits, floats of 32 and 64. The unit is the
+    full scale, FS."""
     if data[:4] != b"RIFF" or data[8:12] != b"WAVE":
         raise InputError(f"{path}: not a WAV file that can be read (only RIFF WAVE)")
     chunks, position = {}, 12
@@ -254,7 +261,7 @@ def _wav(path, data, column):
     if len(wrong):
         raise InputError(f"{path}: sample {wrong[0] + 1} is not a finite number")
     return Recording(os.path.basename(path), values, float(rate) or None, "from the WAV header",
-                     "of full scale", f"channel {channel} of {channels}", [])
+                     "FS", f"channel {channel} of {channels}", [])
 
 
 def _samples(body, form, bits):

@@ -98,6 +98,7 @@ def _trace(axes, x, y, **style):
 
 def overview(recording):
     n, unit = len(recording.values), recording.unit
+    counted = f"{n} sample" + "s" * (n != 1)
     figures = []
     plt = _pyplot()
     times = recording.times()
@@ -117,10 +118,10 @@ def overview(recording):
         axes.margins(x=0.005)
         figures.append(_svg(plt, figure))
     if recording.rate:
-        text = (f"{n} samples, {n / recording.rate:.6g} s at {recording.rate:.10g} samples per "
+        text = (f"{counted}, {n / recording.rate:.6g} s at {recording.rate:.10g} samples per "
                 f"second ({recording.rate_source}).")
     else:
-        text = f"{n} samples; the sampling rate is not known (--rate sets it)."
+        text = f"{counted}; the sampling rate is not known (--rate sets it)."
     if unit:
         text += f" Values in {unit}."
     return Section("Recording", text, figures=figures)
@@ -148,7 +149,7 @@ def statistics(recording):
                  "Moment_head") for order, moment in moments.items()]
     deviation = math.sqrt(moments[2])
     rows.append(Row("Standard deviation", number(deviation), unit, "√ moment 2"))
-    if deviation > 0:
+    if deviation > 0 and math.isfinite(moments[4]):
         rows.append(Row("Skewness", number(moments[3] / deviation**3), "",
                         "moment 3 / deviation³"))
         rows.append(Row("Kurtosis", number(moments[4] / deviation**4), "",

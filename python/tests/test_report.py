@@ -93,7 +93,7 @@ class Reading(InFolder):
                 (b"\x7fELF\x01\0\0", ":1: neither"),
                 (b"1\n2\n\x00\n", ":3: neither"), (b"RIFF\0\0\0\0WAVE", "no format"),
                 (wav([]), "no samples"), (wav([b"\0\0"], form=85), "cannot be read"),
-                (nan_wav, "sample 2")):
+                (nan_wav, "sample 2"), ("1e308\n-1e308\n", "more than a plot can span")):
             with self.subTest(content=content[:30]):
                 path = self.file(content)
                 code, _, err = run("report", path, "--output", self.folder / "out")
@@ -136,7 +136,7 @@ class Report(InFolder):
             xml.etree.ElementTree.fromstring(figure)
 
     def test_of_data_without_spread_and_of_one_sample(self):
-        for text in ("7\n", "7\n7\n7\n", "1e300\n-1e300\n", "0\n"):
+        for text in ("7\n", "7\n7\n7\n", "1e300\n-1e300\n", "0\n", "1e100\n" + 20 * "-2e99\n"):
             with self.subTest(text=text):
                 code, out, err = run("report", self.file(text), "--output", self.folder / "out")
                 self.assertEqual((code, err), (0, ""))
