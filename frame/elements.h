@@ -58,12 +58,20 @@ inline void Fill(DBL *to, std::ptrdiff_t count, double value) {
         to[i] = value;
 }
 
+inline void Swap(DBL *a, DBL *b) {
+    const double held = *a;
+    *a = *b;
+    *b = held;
+}
+
+inline void OrderPair(DBL *a, DBL *b) {
+    if (*b < *a)
+        Swap(a, b);
+}
+
 inline void Reverse(DBL *a, std::ptrdiff_t count) {
-    for (std::ptrdiff_t i = 0, j = count - 1; i < j; ++i, --j) {
-        const double held = a[i];
-        a[i] = a[j];
-        a[j] = held;
-    }
+    for (std::ptrdiff_t i = 0, j = count - 1; i < j; ++i, --j)
+        Swap(&a[i], &a[j]);
 }
 
 } // namespace qx

@@ -1,5 +1,6 @@
 #include "stats/order.h"
 
+#include "frame/elements.h"
 #include "frame/finish.h"
 #include "stats/sort.h"
 
@@ -7,21 +8,6 @@
 #include <cstring>
 
 namespace qx {
-
-namespace {
-
-void Swap(DBL *a, DBL *b) {
-    const double held = *a;
-    *a = *b;
-    *b = held;
-}
-
-void OrderPair(DBL *a, DBL *b) {
-    if (*b < *a)
-        Swap(a, b);
-}
-
-} // namespace
 
 // Median-of-three partition selection. The two scans need no bound: the pivot itself stops the
 // one that goes down, and the element at r, which is no smaller than the pivot, or a NaN, the one

@@ -1,5 +1,7 @@
 #include "stats/sort.h"
 
+#include "frame/elements.h"
+
 #include <algorithm>
 #include <bit>
 #include <cstdint>
@@ -10,17 +12,6 @@ namespace qx {
 namespace {
 
 constexpr std::ptrdiff_t insertionLimit = 20;
-
-void Swap(DBL *a, DBL *b) {
-    const double held = *a;
-    *a = *b;
-    *b = held;
-}
-
-void OrderPair(DBL *a, DBL *b) {
-    if (*b < *a)
-        Swap(a, b);
-}
 
 void InsertionSort(DBL *a, std::ptrdiff_t n) {
     for (std::ptrdiff_t i = 1; i < n; ++i) {

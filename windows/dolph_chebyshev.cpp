@@ -4,8 +4,8 @@
 #include "frame/scratch.h"
 #include "transforms/dct.h"
 
-#include <algorithm>
 #include <cmath>
+#include <cstring>
 #include <limits>
 #include <numbers>
 
@@ -66,7 +66,7 @@ ErrorCode GenerateDolChebyWindow(DBL *w, double *peak, int32_t length, double ra
     const ErrorCode status = RightHalf(w, half, length, ratio);
     if (status >= 0) {
         const int32_t middle = length % 2; // of an odd window, on both sides the same value
-        std::copy(w + middle, w + half, w + half);
+        std::memcpy(w + half, w + middle, static_cast<std::size_t>(half - middle) * sizeof(DBL));
         Reverse(w, half);
     }
     // kept: handed back also after a failure

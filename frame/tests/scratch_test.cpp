@@ -213,6 +213,8 @@ TEST(Workspace, ResizeKeepsContentAndAStaleTotalSize) {
         ASSERT_EQ(qx::ScratchRealloc(&block, 24), 0);
         if (inRegion) {
             EXPECT_EQ(block, first) << "a smaller block stays";
+            ASSERT_EQ(qx::ScratchRealloc(&block, 40), 0);
+            EXPECT_EQ(block, first) << "and one of its first size";
         }
         ASSERT_EQ(qx::ScratchRealloc(&block, 100), 0);
         EXPECT_TRUE(matches(block, 24));
@@ -229,6 +231,28 @@ TEST(Workspace, ResizeKeepsContentAndAStaleTotalSize) {
         EXPECT_EQ(block, nullptr);
         EXPECT_EQ(analysisWorkspace.liveBlocks(), 0);
     }
+
+    // A move takes over the first size or the new one, whichever is less, and not a byte more.
+    struct Move {
+        int32_t first, then, last, moved;
+    };
+    for (const Move &move : {Move{60, 24, 80, 60}, {60, 60, 24, 24}, {40, 100, 200, 40}})
+        for (const bool intoRegion : {false, true}) {
+            analysisWorkspace.setEnabled(true);
+            void *block = qx::ScratchAllocPointer(300);
+            std::memset(block, 0xEE, 300); // what the region's next block finds
+            qx::ScratchFree(block);
+            analysisWorkspace.setEnabled(!intoRegion);
+            block = qx::ScratchAllocPointer(move.first);
+            ASSERT_EQ(qx::ScratchRealloc(&block, move.then), 0);
+            fill(block, move.then);
+            analysisWorkspace.setEnabled(intoRegion);
+            ASSERT_EQ(qx::ScratchRealloc(&block, move.last), 0);
+            EXPECT_TRUE(matches(block, std::min(move.moved, move.then)));
+            for (int32_t i = move.moved; intoRegion && i < 200; ++i)
+                ASSERT_EQ(static_cast<unsigned char *>(block)[i], 0xEE) << i;
+            qx::ScratchFree(block);
+        }
 
     // A resize that the region cannot serve has lost the old block.
     analysisWorkspace.setEnabled(true);

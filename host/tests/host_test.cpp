@@ -47,6 +47,21 @@ TEST(Blocks, KeepTheirElementsThroughGrowthAndShrinking) {
     QXHostFree(nullptr);
 }
 
+TEST(Blocks, GiveMemoryBackWhereItIsWorthAMove) {
+    Array1DHandle array = QXHostNew1D(QXTypeDBL, 10000);
+    const auto stays = [&](int32_t count) {
+        const void *const before = *array;
+        EXPECT_EQ(HostBlockReshape(QXTypeDBL, 1, &array, count), 0);
+        return *array == before;
+    };
+    EXPECT_TRUE(stays(6000));
+    EXPECT_TRUE(stays(10000)) << "the capacity was kept";
+    EXPECT_FALSE(stays(4000)) << "less than half";
+    EXPECT_FALSE(stays(400));
+    EXPECT_TRUE(stays(4)) << "a small block is not worth a move";
+    QXHostFree(array);
+}
+
 TEST(Blocks, OfTwoDimensionsStartAtByteEight) {
     const double values[] = {1, 2, 3, 4, 5, 6};
     Array2DHandle array = QXHostCopy2D(QXTypeDBL, 2, 3, values);
@@ -152,7 +167,9 @@ TEST(Sweeps, RunOncePerRunAndObjectsAreForgotten) {
     EXPECT_EQ(removedMeanwhile.calls, 0);
     EXPECT_EQ(replaced.calls, 2);
 
-    EXPECT_EQ(HostRegisterSweep(Count, &object, 2), 0);
+    EXPECT_EQ(HostRegisterSweep(Count, &object, 1), 0);
+    EXPECT_EQ(QXHostReleaseObject(&object), 0);
+    EXPECT_EQ(HostRegisterSweep(Count, &object, 2), 0) << "the latest mode counts";
     EXPECT_EQ(QXHostReleaseObject(&process), 0) << "a process's sweep is no object's";
     EXPECT_EQ(QXHostReleaseObject(&object), 1);
     EXPECT_EQ(QXHostReleaseObject(&object), 0);

@@ -98,6 +98,29 @@ TEST(BasicStatistics, SumsRunFromTheFirstElement) {
     EXPECT_NE(value, 0x1p-60);
 }
 
+// Powers by squaring: any other order of the products rounds differently for this value.
+TEST(BasicStatistics, MomentsTakePowersBySquaring) {
+    const double a = 1.0 + 0x1.555p-13;
+    const auto seventh = [](double d) {
+        const double d2 = d * d;
+        const double d4 = d2 * d2;
+        return d * d2 * d4;
+    };
+    const auto sixth = [](double d) {
+        const double d2 = d * d;
+        return d2 * (d2 * d2);
+    };
+    const DBLArray x{-3.0 * a, a, a, a}; // the mean is 0 exactly
+    double value;
+    ErrorCode err;
+    for (const int32_t order : {6, 7}) {
+        const auto power = [&](double d) { return order == 6 ? sixth(d) : seventh(d); };
+        Moment_head(x.handle(), &order, &value, &err);
+        EXPECT_EQ(value, (power(-3.0 * a) + power(a) + power(a) + power(a)) / 4);
+        EXPECT_NE(power(a), order == 6 ? a * a * a * a * a * a : a * a * a * a * a * a * a);
+    }
+}
+
 TEST(BasicStatistics, OverflowAndNonFiniteValuesPropagate) {
     double value;
     ErrorCode err;

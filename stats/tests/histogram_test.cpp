@@ -1,5 +1,6 @@
 #include "qx/qx.h"
 #include "stats/histogram.h"
+#include "tests/support/heap_probe.h"
 #include "tests/support/hostile_host.h"
 #include "tests/support/recipe.h"
 
@@ -15,6 +16,7 @@ namespace {
 
 using qx::test::Array1D;
 using qx::test::DBLArray;
+using qx::test::HeapProbe;
 using qx::test::I32Array;
 
 constexpr double inf = std::numeric_limits<double>::infinity();
@@ -76,6 +78,8 @@ TEST(Histogram, CentresAreAccumulated) {
 
 TEST(Histogram, TreatsEdgesConstantsAndNaN) {
     const Histogram edge = HistogramOf({0.0, 1.0, 2.0, 4.0}, 4);
+    // Times the bins per unit: divided by the width of a bin, 0.3 would stand one bin lower.
+    EXPECT_EQ(HistogramOf({0.0, 0.3, 1.0}, 10).counts[3], 1);
     EXPECT_EQ(edge.counts, (std::vector<int32_t>{1, 1, 1, 1}));
     const Histogram constant = HistogramOf({3.5, 3.5, 3.5}, 3);
     EXPECT_EQ(constant.counts, (std::vector<int32_t>{0, 0, 3}));
@@ -89,9 +93,10 @@ TEST(Histogram, TreatsEdgesConstantsAndNaN) {
 
     I32 counts[2];
     DBL centres[2];
-    const DBL x[] = {-1.0, 0.0, 0.5, 1.0, 2.0, nan, 1e300};
-    EXPECT_EQ(qx::ArrayHistogram(x, 7, 1.0, 0.0, counts, centres, 2), ErrRangeReversed);
-    EXPECT_EQ(qx::ArrayHistogram(x, 7, 0.0, 1.0, counts, centres, 2), 0);
+    const DBL x[] = {-1.0, 0.0, 0.5, 1.0, 2.0, nan, 1e300, -0.25};
+    EXPECT_EQ(qx::ArrayHistogram(x, 0, 1.0, 0.0, counts, centres, 0), ErrRangeReversed);
+    EXPECT_EQ(qx::ArrayHistogram(x, 0, 0.0, 1.0, counts, centres, 2), ErrEmptyInput);
+    EXPECT_EQ(qx::ArrayHistogram(x, 8, 0.0, 1.0, counts, centres, 2), 0);
     EXPECT_EQ(counts[0], 1);
     EXPECT_EQ(counts[1], 2) << "what lies outside is dropped";
 }
@@ -145,6 +150,26 @@ General GeneralOf(const std::vector<double> &samples, const std::vector<HistInte
               0);
     result.counts = counts.values();
     return result;
+}
+
+TEST(GeneralHistogram, WithoutMemoryTheCountsAreSizedAndEmptied) {
+    if (!HeapProbe::works())
+        GTEST_SKIP();
+    const DBLArray x{1.0};
+    const Array1D<qx::ElementType::U8> intervals(sizeof(HistInterval));
+    (*intervals.handle())->dimSize = 1;
+    const I32Array counts(9);
+    HistSummary summary = {7, 7, 7};
+    ErrorCode err = 0;
+    qx::test::ResetHost();
+    {
+        const HeapProbe probe(1);
+        GenHistH(x.handle(), intervals.handle(), counts.handle(), &summary, &err);
+    }
+    EXPECT_EQ(err, ErrOutOfMemory);
+    EXPECT_EQ(qx::test::Host().reshapes,
+              (std::vector<qx::test::Reshape>{{QXTypeI32, 1, 1}, {QXTypeI32, 1, 0}}));
+    EXPECT_EQ(summary.outside, 0);
 }
 
 TEST(GeneralHistogram, CountsInOverlappingIntervalsAndTellsWhereTheRestLies) {

@@ -332,6 +332,11 @@ TEST(Mode, ExactModesAreTheLongestRuns) {
     // Equal is what lies within an epsilon of the first of the run.
     const double next = std::nextafter(1.0, 2.0);
     EXPECT_EQ(ModesOf({next, 1.0, 7.0, 9.0}, 0), (Values{1.0}));
+    // ... and not of its neighbour: four values in a chain make two runs, three make one.
+    const double second = std::nextafter(next, 2.0);
+    const double third = std::nextafter(second, 2.0);
+    EXPECT_EQ(ModesOf({third, second, next, 1.0, 9.0}, 0), (Values{1.0, second}));
+    EXPECT_EQ(ModesOf({second, next, 1.0, 9.0}, 0), (Values{1.0}));
     // At 0 the tolerance is 0, so only zeros are equal to it.
     EXPECT_EQ(ModesOf({0.0, 5e-324, 1.0, 2.0}, 0), Values());
     EXPECT_EQ(ModesOf({0.0, -0.0, 1.0, 2.0}, 0), (Values{0.0}));
@@ -341,6 +346,8 @@ TEST(Mode, BinnedModesAreCentresOfTheFullestBins) {
     EXPECT_EQ(ModesOf({0.0, 0.1, 0.2, 3.9, 4.0, 4.0, 2.0}, 4), (Values{0.5, 3.5}));
     EXPECT_EQ(ModesOf({0.0, 1.0, 2.0, 4.0}, 4), Values()) << "no bin has two";
     EXPECT_EQ(ModesOf({2.5, 2.5}, 10), (Values{2.5}));
+    const double next = std::nextafter(1.0, 2.0);
+    EXPECT_EQ(ModesOf({1.0, next}, 4), (Values{next})) << "equal within an epsilon";
     EXPECT_EQ(ModesOf({-2.0, -1.0, 0.0, -0.1, -1.9}, 2), (Values{-0.5}))
         << "a maximum of 0 has no tolerance";
     EXPECT_EQ(ModesOf({nan, nan}, 3), Values());
