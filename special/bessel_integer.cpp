@@ -17,6 +17,7 @@ constexpr double kNaN = std::numeric_limits<double>::quiet_NaN();
 constexpr double kTwoOverPi = 0.6366197723675814;
 constexpr double kInvSqrtPi = 0.5641895835477563;
 constexpr double kSmall = 8;
+constexpr double kLowTo = 16; // in x^2, of Y less its logarithm
 constexpr double kFar = 20;
 constexpr double kUniformFrom = 200;
 constexpr double kTiny = 1e-8; // x^2 / 4 is below half an ulp of 1
@@ -153,7 +154,9 @@ double BesselY0(double x) {
         return 0;
     if (x >= kSmall)
         return Wave0(x).y;
-    return table::y0Low(x * x) + kTwoOverPi * std::log(x) * BesselJ0(x);
+    const double z = x * x;
+    const double low = z < kLowTo ? table::y0Low(z) : table::y0Mid(z);
+    return low + kTwoOverPi * std::log(x) * BesselJ0(x);
 }
 
 double BesselY1(double x) {
@@ -161,7 +164,9 @@ double BesselY1(double x) {
         return 0;
     if (x >= kSmall)
         return Wave1(x).y;
-    return x * table::y1Low(x * x) + kTwoOverPi * (std::log(x) * BesselJ1(x) - 1 / x);
+    const double z = x * x;
+    const double low = z < kLowTo ? table::y1Low(z) : table::y1Mid(z);
+    return x * low + kTwoOverPi * (std::log(x) * BesselJ1(x) - 1 / x);
 }
 
 double BesselJn(double n, double x) {

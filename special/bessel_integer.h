@@ -6,9 +6,10 @@ namespace qx {
 // The Bessel functions of integer order, n >= 0, x >= 0.
 //
 // Orders 0 and 1, J and Y: up to x = 8 rational forms in x^2, with the zeros of J in that range
-// divided out and the logarithm of Y split off; from 8 on modulus and phase with rational forms
-// in 1 / x^2, broken at 20. I: rational forms in x^2 up to 8, in 1 / x from there, broken at 24.
-// K: up to 1 the logarithm is split off; from there rational forms in 1 / x, broken at 5.
+// divided out and the logarithm of Y split off (broken at 4); from 8 on modulus and phase with
+// rational forms in 1 / x^2, broken at 20. I: rational forms in x^2 up to 8, in 1 / x from there,
+// broken at 24. K: up to 1 the logarithm is split off; from there rational forms in 1 / x, broken
+// at 5.
 //
 // Near the zeros of J and Y the error is absolute, a few eps of the modulus.
 double BesselJ0(double x);

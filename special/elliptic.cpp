@@ -13,7 +13,8 @@ constexpr double kNaN = std::numeric_limits<double>::quiet_NaN();
 constexpr double kEps = 2.220446049250313e-16;
 constexpr double kPi = 3.141592653589793;
 constexpr double kHalfPi = 1.5707963267948966;
-constexpr int kMostRounds = 40; // of Landen's transformation; about 8 are made
+constexpr double kHalfPiLow = 6.123233995736766e-17; // pi / 2 less its double
+constexpr int kMostRounds = 40;                      // of Landen's transformation; about 8 are made
 
 bool IsParameter(double m) { return m >= 0 && m <= 1; }
 
@@ -36,10 +37,10 @@ Incomplete Landen(double phi, double m) {
         phi += std::atan(t * ratio) + turns * kPi;
         turns = std::floor((phi + kHalfPi) / kPi);
         t *= (1 + ratio) / (1 - ratio * t * t);
-        c = 0.5 * (a - b);
         const double mean = std::sqrt(a * b);
         a = 0.5 * (a + b);
         b = mean;
+        c = 0.25 * c * c / a; // half the difference of a and b before, without its cancellation
         d += d;
         extra += c * std::sin(phi);
     }
@@ -55,9 +56,8 @@ struct Amplitude {
 Amplitude Split(double phi) {
     if (std::fabs(phi) <= kHalfPi)
         return {0, phi};
-    constexpr double piLow = 1.2246467991473532e-16; // pi less its double
     const double n = std::rint(phi / kPi);
-    return {n, (phi - n * kPi) - n * piLow};
+    return {n, (phi - n * kPi) - n * (2 * kHalfPiLow)};
 }
 
 bool IsQuarter(double phi) { return std::fabs(phi - kHalfPi) <= kEps; }
@@ -68,7 +68,7 @@ double EllipticK(double m) {
     if (!IsParameter(m))
         return kNaN;
     if (m <= 0.5)
-        return m == 0 ? kHalfPi : table::ellipticKSmall(m);
+        return kHalfPi + (m * table::ellipticKSmall(m) + kHalfPiLow);
     const double m1 = 1 - m;
     return table::ellipticKNear(m1) - std::log(m1) * table::ellipticKLog(m1);
 }
@@ -77,7 +77,7 @@ double EllipticE(double m) {
     if (!IsParameter(m))
         return kNaN;
     if (m <= 0.5)
-        return m == 0 ? kHalfPi : table::ellipticESmall(m);
+        return kHalfPi - (m * table::ellipticESmall(m) - kHalfPiLow);
     if (m == 1)
         return 1;
     const double m1 = 1 - m;

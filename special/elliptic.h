@@ -4,8 +4,8 @@
 namespace qx {
 
 // Elliptic integrals of the first and second kind by their parameter m = k^2, NaN outside [0, 1].
-// Complete: a rational form in m up to 1/2, beyond it P(1 - m) - ln(1 - m) Q(1 - m), which carries
-// the logarithmic end exactly.
+// Complete: pi/2 and m times a rational form up to m = 1/2, beyond it P(1 - m) - ln(1 - m) Q(1 -
+// m), which carries the logarithmic end exactly.
 double EllipticK(double m);
 double EllipticE(double m);
 

@@ -17,11 +17,14 @@ EPS = mpf(10) ** -25
 
 def elliptic(folder):
     t = Table("elementary.py", "QX_SPECIAL_TABLES_ELLIPTIC_H")
-    t.add("ellipticKSmall", "K(m) in m", ellipk, 0, mpf(1) / 2, 6, 6)
+    # the constant apart, so that only the smaller part has the rounding of a rational form
+    t.add("ellipticKSmall", "(K(m) - pi / 2) / m in m", lambda m: (ellipk(m) - pi / 2) / m if m else pi / 8,
+          0, mpf(1) / 2, 6, 6)
     t.add("ellipticKNear", "K + ln(m1) K(m1) / pi in m1 = 1 - m",
           lambda u: ellipk(1 - u) + log(u) * ellipk(u) / pi if u else log(mpf(4)), mpf(0), mpf(1) / 2, 6, 6)
     t.add("ellipticKLog", "K(m1) / pi in m1", lambda u: ellipk(u) / pi, 0, mpf(1) / 2, 6, 6)
-    t.add("ellipticESmall", "E(m) in m", ellipe, 0, mpf(1) / 2, 6, 6)
+    t.add("ellipticESmall", "(pi / 2 - E(m)) / m in m", lambda m: (pi / 2 - ellipe(m)) / m if m else pi / 8,
+          0, mpf(1) / 2, 6, 6)
     # E = S(m1) - ln(m1) m1 L(m1), with L = (K(m1) - E(m1)) / (pi m1)
     t.add("ellipticENear", "E + ln(m1) (K(m1) - E(m1)) / pi in m1",
           lambda u: ellipe(1 - u) + log(u) * (ellipk(u) - ellipe(u)) / pi, EPS, mpf(1) / 2, 6, 6)
