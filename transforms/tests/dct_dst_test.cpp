@@ -5,6 +5,7 @@
 #include "tests/support/hostile_host.h"
 #include "tests/support/transform_reference.h"
 #include "transforms/dct.h"
+#include "transforms/dst.h"
 
 #include <gtest/gtest.h>
 
@@ -315,6 +316,70 @@ TEST(DCTDST, EveryFailedAllocationEndsCleanly) {
     }
 }
 
+// Which of the plan and the work block comes first shows in the slot where only one can be had.
+TEST(DCTDST, ThePlanComesBeforeTheWorkOfTheCosineTransformOnly) {
+    if (!HeapProbe::works())
+        GTEST_SKIP();
+    const DBLArray x(RandomSignal(6));
+    for (const Family &family : Families) {
+        bool failed = true;
+        int withPlan = 0;
+        for (int32_t failAt = 1; failed; ++failAt) {
+            DBLArray out(1);
+            Node node;
+            {
+                const HeapProbe probe(failAt);
+                failed = family.forward(x.handle(), out.handle(), 0, &node.slot) != 0;
+            }
+            withPlan += failed && node.slot != nullptr;
+        }
+        EXPECT_EQ(withPlan > 0, family.forward == DCT_1DH) << family.name;
+    }
+}
+
+// The two directions commute but for rounding; the bits tell which came first.
+TEST(DCTDST, InverseRunsColumnsFirstForTheCosineAndRowsFirstForTheSine) {
+    constexpr int32_t rows = 7, cols = 10;
+    const DBLMatrix in(rows, cols);
+    Fill(in, RandomSignal(in.size()));
+    for (const Family &family : Families) {
+        SCOPED_TRACE(family.name);
+        Node node;
+        Signal values(in.values());
+        const auto alongRows = [&] {
+            for (int32_t r = 0; r < rows; ++r) {
+                const DBLArray row(
+                    Signal(values.begin() + r * cols, values.begin() + (r + 1) * cols));
+                DBLArray out;
+                ASSERT_EQ(family.inverse(row.handle(), out.handle(), &node.slot), 0);
+                for (int32_t c = 0; c < cols; ++c)
+                    values[r * cols + c] = out[c];
+            }
+        };
+        const auto alongColumns = [&] {
+            for (int32_t c = 0; c < cols; ++c) {
+                DBLArray column(rows), out;
+                for (int32_t r = 0; r < rows; ++r)
+                    column.data()[r] = values[r * cols + c];
+                ASSERT_EQ(family.inverse(column.handle(), out.handle(), &node.slot), 0);
+                for (int32_t r = 0; r < rows; ++r)
+                    values[r * cols + c] = out[r];
+            }
+        };
+        if (family.inverse == InvDCT_1DH) {
+            alongColumns();
+            alongRows();
+        } else {
+            alongRows();
+            alongColumns();
+        }
+        DBLMatrix out;
+        Node other;
+        ASSERT_EQ(family.inverse2D(in.handle(), out.handle(), &other.slot, &other.second), 0);
+        EXPECT_TRUE(SameBits(out.values(), values));
+    }
+}
+
 TEST(DCTDST, InnerRoutinesCheckTheirArguments) {
     FFTPlan *const plan = qx::create_oxfft_table(4);
     Signal x = RandomSignal(8), out(8), work(64);
@@ -323,6 +388,13 @@ TEST(DCTDST, InnerRoutinesCheckTheirArguments) {
               ErrFFTSizeNotPositive);
     EXPECT_EQ(qx::DCTForward(plan, x.data(), 5, out.data(), 1, 1, 5, work.data()), ErrInternal);
     EXPECT_EQ(qx::DCTInverse(x.data(), out.data(), 1, 1, 6, work.data(), plan), ErrInternal);
+    EXPECT_EQ(qx::DCTInverse(x.data(), out.data(), 1, 1, 0, work.data(), plan), ErrEmptyInput);
+    EXPECT_EQ(qx::DSTForward(plan, x.data(), 0, out.data(), 1, 1, 0, work.data()), ErrEmptyInput);
+    EXPECT_EQ(qx::DSTForward(plan, x.data(), 1, out.data(), 1, 1, 0, work.data()),
+              ErrFFTSizeNotPositive);
+    EXPECT_EQ(qx::DSTForward(plan, x.data(), 4, out.data(), 1, 1, 4, work.data()), ErrInternal);
+    EXPECT_EQ(qx::DSTInverse(x.data(), out.data(), 1, 1, 4, work.data(), plan), ErrInternal);
+    EXPECT_EQ(qx::DSTInverse(x.data(), out.data(), 1, 1, 0, work.data(), plan), ErrEmptyInput);
 
     // Strides on both sides, in place, with a short input.
     Signal strided = x;

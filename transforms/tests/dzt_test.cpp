@@ -4,9 +4,11 @@
 #include "tests/support/heap_probe.h"
 #include "tests/support/hostile_host.h"
 #include "tests/support/transform_reference.h"
+#include "transforms/dzt.h"
 
 #include <gtest/gtest.h>
 
+#include <cmath>
 #include <limits>
 
 namespace {
@@ -92,6 +94,49 @@ TEST(BandTransform, FoldsLongInputsFromTheSubLengthOn) {
     const std::vector<CDB> before = complex.values();
     ASSERT_EQ(CxDZTH(complex.handle(), 2, 3, 0, 6, out.handle(), &node.slot), 0);
     EXPECT_EQ(complex[1].im, before[1].im + before[4].im + before[10].im);
+}
+
+// With one value per sub-sequence and all but one of them zero, the rotation itself comes out.
+TEST(BandTransform, TurnsByMultiplicationFromTheFirstOutputOn) {
+    constexpr double twoPi = 6.283185307179586;
+    constexpr int32_t sections = 11, start = -25, size = 40;
+    int differing = 0;
+    for (int32_t j = 0; j < sections; ++j) {
+        DBLArray x(Signal(sections, 0.0));
+        x.data()[j] = 1.0;
+        CDBArray out;
+        Node node;
+        ASSERT_EQ(ReDZTH(x.handle(), sections, 1, start, size, out.handle(), &node.slot), 0);
+        const double theta = -twoPi * (double{1} * j / sections);
+        const double phi = start % sections * theta;
+        double c = std::cos(phi), s = std::sin(phi);
+        for (int32_t i = 0; i < size; ++i) {
+            ASSERT_EQ(out[i].re, c);
+            ASSERT_EQ(out[i].im, s);
+            const double turned = c * std::cos(theta) - s * std::sin(theta);
+            s = c * std::sin(theta) + s * std::cos(theta);
+            c = turned;
+            differing += c != std::cos(phi + (i + 1) * theta);
+        }
+    }
+    EXPECT_GT(differing, 0);
+}
+
+TEST(BandTransform, TheInnerRoutineChecksItsPlan) {
+    FFTPlan *const plan = qx::create_oxfft_table(4);
+    Signal x = RandomSignal(8);
+    std::vector<CDB> out(2);
+    const auto run = [&](const FFTPlan *with, int32_t n, int32_t sections, int32_t subLength) {
+        return qx::BandTransform<qx::ElementType::DBL>(with, x.data(), n, sections, subLength, 0, 2,
+                                                       out.data());
+    };
+    EXPECT_EQ(run(nullptr, 0, 0, 0), ErrEmptyInput);
+    EXPECT_EQ(run(nullptr, 8, 0, 4), ErrFFTSizeNotPositive);
+    EXPECT_EQ(run(nullptr, 8, 2, 0), ErrFFTSizeNotPositive);
+    EXPECT_EQ(run(nullptr, 8, 2, 4), ErrInternal);
+    EXPECT_EQ(run(plan, 8, 2, 3), ErrInternal);
+    EXPECT_EQ(run(plan, 8, 2, 4), 0);
+    qx::destroy_oxfft_table(plan);
 }
 
 TEST(BandTransform, ChecksComeInOrderAndEmptyInputIsNoFailure) {

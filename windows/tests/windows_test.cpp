@@ -156,6 +156,38 @@ TEST(Windows, TheRotationStaysAccurateOverAMillionSamples) {
     EXPECT_LT(worst, 1e-13) << "relative to the peak of 1";
 }
 
+// The rotation with any number of terms, which takes another road than the named windows.
+TEST(Windows, ManyTermsRotateLikeTheNamedWindows) {
+    constexpr int n = 1000000;
+    const DBLArray coefs{0.27105140069342415,
+                         0.43329793923448606,
+                         0.21812299954311062,
+                         0.0659254463880309,
+                         0.010811742098372268,
+                         0.0007765848252250934,
+                         1.3887217350903198e-05,
+                         0.0,
+                         0.0};
+    EXPECT_EQ(WindowOf(n, [&](DBL1D x) { return GenCosWinH(x, coefs.handle()); }),
+              WindowOf(n, [](DBL1D x) { return AllCosWinH(x, 8, 0); }));
+}
+
+// The series stops behind the first term of at most 1e-8, and after 25 terms in any case.
+TEST(Windows, TheKaiserSeriesIsCutShortWhereItAlwaysWas) {
+    const auto series = [](long double beta, int terms) {
+        long double sum = 1, term = 1;
+        for (int k = 1; k <= terms; ++k)
+            sum += term *= beta * beta / (4.0L * k * k);
+        return sum;
+    };
+    const auto edge = [](double beta) {
+        return WindowOf(2, [=](DBL1D x) { return KaiserH(x, beta); })[0];
+    };
+    EXPECT_NEAR(edge(1.0) * static_cast<double>(series(1, 6)), 1.0, 4e-16);
+    EXPECT_GT(static_cast<double>(series(1, 7) / series(1, 6)) - 1.0, 1e-12) << "it shows";
+    EXPECT_NEAR(edge(100.0) * static_cast<double>(series(100, 25)), 1.0, 1e-14);
+}
+
 TEST(Windows, TapersAndCutsEndWhereTheyShould) {
     const auto taper = [](int n, double ratio) {
         return WindowOf(n, [=](DBL1D x) { return CosTaperedH(x, ratio); });
@@ -179,6 +211,22 @@ TEST(Windows, TapersAndCutsEndWhereTheyShould) {
     EXPECT_EQ(CxCosTaperedH(z.handle(), 0.5), 0);
     for (int i = 0; i < 12; ++i)
         EXPECT_NEAR(z[i].im, 2.0 * sines[static_cast<std::size_t>(i)], 1e-15);
+    // The complex form takes each phase afresh, the real form adds the steps up.
+    constexpr int length = 1000, half = 450;
+    const CDBArray fresh(std::vector<CDB>(length, CDB{1.0, 1.0}));
+    EXPECT_EQ(CxCosTaperedH(fresh.handle(), 0.9), 0);
+    const Values added = taper(length, 0.9);
+    double step = std::numbers::pi / (2.0 * half);
+    double phase = step;
+    int differing = 0;
+    for (int i = 1; i < half; ++i, phase += step) {
+        const double s = std::sin(i * std::numbers::pi / (2.0 * half));
+        const double t = std::sin(phase);
+        EXPECT_EQ(fresh[i].re, s * s);
+        EXPECT_EQ(added[static_cast<std::size_t>(i)], t * t);
+        differing += s != t;
+    }
+    EXPECT_GT(differing, 0);
 
     const auto force = [](double percent) {
         const Values w = WindowOf(8, [=](DBL1D x) { return ForceWinH(x, percent); });
@@ -225,6 +273,8 @@ TEST(Windows, OneSampleAndNoneAndTheirCodes) {
     expect(2, [](DBL1D x) { return SymmWinH(x, 30, 0.0); }, 0, {0.0, 0.0});
     expect(2, [](DBL1D x) { return SymmWinH(x, 1, 0.0); }, 0, {1.0, 1.0});
     expect(1, [](DBL1D x) { return SymmWinH(x, 99, 0.0); }, 0, {1.0});
+    expect(0, [](DBL1D x) { return AllWinH(x, 0, 0.0, 0, 0); }, 0, {});
+    expect(0, [](DBL1D x) { return AllWinH(x, 0, 0.0, 0, 1); }, ErrEmptyInput, {});
 }
 
 TEST(Windows, SelectorsAreCheckedInEveryForm) {
@@ -283,6 +333,12 @@ TEST(Windows, AScaledWindowHasACoherentGainOfOne) {
     constants = {0, 0};
     EXPECT_EQ(ScaledWinH(x.handle(), 64, 0, &constants), ErrInvalidSelector);
     EXPECT_TRUE(std::isnan(constants.cg));
+    const DBLArray negative(0);
+    (*negative.handle())->dimSize = -1;
+    constants = {7, 7};
+    EXPECT_EQ(ScaledWinH(negative.handle(), 99, 0, &constants), ErrNegativeDimension);
+    EXPECT_EQ(constants.enbw, 7.0) << "the constants are left alone";
+    EXPECT_EQ(negative.size(), 0);
 }
 
 TEST(WindowConstants, AreStoredOrMeasured) {
@@ -323,6 +379,27 @@ TEST(WindowConstants, AreStoredOrMeasured) {
                                                                                 {34, 1.2}}) {
         EXPECT_EQ(WinConstByNameH(100000, selector, 0, &c), 0);
         EXPECT_NEAR(c.enbw, enbw, 1e-6) << selector;
+    }
+    // The stored figures stand on their own, but near those of the coefficients.
+    const std::vector<std::pair<int32_t, Values>> sums{
+        {1, {0.5, 0.5}},
+        {2, {0.54, 0.46}},
+        {3, {0.42323, 0.49755, 0.07922}},
+        {4, {7938.0 / 18608, 9240.0 / 18608, 1430.0 / 18608}},
+        {5, {0.42, 0.5, 0.08}},
+        {6, {0.215578948, 0.41663158, 0.277263158, 0.083578947, 0.006947368}},
+        {7, {0.35875, 0.48829, 0.14128, 0.01168}},
+        {9, {0.323215218, 0.471492057, 0.17553428, 0.028497078, 0.001261367}},
+        {11, {0.3635819, 0.4891775, 0.1365995, 0.0106411}}};
+    for (const auto &[selector, a] : sums) {
+        double enbw = 1.0;
+        for (std::size_t k = 1; k < a.size(); ++k)
+            enbw += 0.5 * (a[k] / a[0]) * (a[k] / a[0]);
+        EXPECT_EQ(WinConstByNameH(3, selector, 0, &c), 0);
+        const bool isLong = selector == 6 || selector == 9;
+        const double bound = isLong ? 1e-8 : (selector == 11 ? 3e-6 : 6e-7);
+        EXPECT_NEAR(c.enbw, enbw, bound) << selector;
+        EXPECT_NEAR(c.cg, a[0], selector == 4 ? 6e-12 : 0.0) << selector;
     }
     WindowConstants decibels = {0, 0};
     EXPECT_EQ(WinConstByNameH(50, 61, 1000.0, &c), 0);
