@@ -50,49 +50,49 @@ struct Heap {
     static void release(void *block) { std::free(block); }
 };
 
-template <class Source, int depth>
+template <class Source, int Depth>
 void RequestAndRelease(int32_t size) {
-    void *blocks[depth];
-    for (int i = 0; i < pairs; i += depth) {
+    void *blocks[Depth];
+    for (int i = 0; i < pairs; i += Depth) {
         for (void *&block : blocks) {
             block = Source::request(size);
             if (block != nullptr)
                 *static_cast<volatile char *>(block) = 1;
         }
-        for (int j = depth; j-- > 0;)
+        for (int j = Depth; j-- > 0;)
             Source::release(blocks[j]);
     }
 }
 
 // Seconds for one pair, as each of the threads sees it.
-template <class Source, int depth>
+template <class Source, int Depth>
 double SecondsPerPair(int threads, int32_t size) {
     std::vector<double> seconds(static_cast<std::size_t>(threads));
     std::barrier start(threads);
     std::vector<std::thread> crew;
     for (double &taken : seconds)
         crew.emplace_back([&] {
-            RequestAndRelease<Source, depth>(size);
+            RequestAndRelease<Source, Depth>(size);
             start.arrive_and_wait();
-            taken = SecondsOf(1, [&] { RequestAndRelease<Source, depth>(size); });
+            taken = SecondsOf(1, [&] { RequestAndRelease<Source, Depth>(size); });
         });
     for (std::thread &thread : crew)
         thread.join();
     return Median(seconds) / pairs;
 }
 
-template <int depth>
+template <int Depth>
 void Compare(int threads, Ratios &all) {
     constexpr int rounds = 15;
     for (int32_t size = 16; size <= 65536; size *= 4) {
         std::vector<double> ours, peers;
         for (int round = 0; round < rounds; ++round) {
-            ours.push_back(SecondsPerPair<Workspace, depth>(threads, size));
-            peers.push_back(SecondsPerPair<Heap, depth>(threads, size));
+            ours.push_back(SecondsPerPair<Workspace, Depth>(threads, size));
+            peers.push_back(SecondsPerPair<Heap, Depth>(threads, size));
         }
         const double ratio = Median(ours) / Median(peers);
         std::printf("scratch, %d thread%s, runs of %d, %5d bytes %8.1f ns  ratio %5.2f\n", threads,
-                    threads > 1 ? "s" : " ", depth, size, Median(ours) * 1e9, ratio);
+                    threads > 1 ? "s" : " ", Depth, size, Median(ours) * 1e9, ratio);
         all.add(ratio);
     }
 }

@@ -8,7 +8,7 @@ std::vector<Recipe> SpectraRecipes() {
     constexpr auto DBL = ElementType::DBL;
     constexpr auto CDB = ElementType::CDB;
     // The positive status of a host leaves the output alone.
-    constexpr unsigned RealCross = HostStatusPassesThrough | MayKeepArrayOnFailure | UsesHeap;
+    constexpr unsigned realCross = HostStatusPassesThrough | MayKeepArrayOnFailure | UsesHeap;
     return {
         {"SpectrumH", [](Call &c) { return SpectrumH(c.inOut<DBL>(0), c.slot(0)); }, UsesHeap},
         {"SpectrumH_IDP",
@@ -26,13 +26,13 @@ std::vector<Recipe> SpectraRecipes() {
          [](Call &c) {
              return CrossSpectrumH(c.in<DBL>(0), c.in<DBL>(1), c.out<CDB>(0), c.slot(0));
          },
-         RealCross},
+         realCross},
         {"CrossSpectrumH_IDP",
          [](Call &c) {
              return CrossSpectrumH_IDP(c.in<DBL>(0), c.in<DBL>(1), c.out<CDB>(0),
                                        c.instance(TransformUnreserveProc));
          },
-         RealCross},
+         realCross},
         {"CxCrossSpectrumH",
          [](Call &c) {
              return CxCrossSpectrumH(c.in<CDB>(0), c.in<CDB>(1), c.out<CDB>(0), c.slot(0));

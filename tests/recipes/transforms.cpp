@@ -109,29 +109,29 @@ std::vector<Recipe> HartleyAndHilbert() {
 // The band transforms fold a long input in place, a positive status of the host leaves their
 // output alone, and only the last short transform's status is reported.
 std::vector<Recipe> BandTransforms() {
-    constexpr unsigned Band =
+    constexpr unsigned band =
         Transform | TakesEmptyInput | MayKeepArrayOnFailure | MemoryFailureMayPass;
     return {
         {"ReDZTH",
          [](Call &c) {
              return ReDZTH(c.spoiled<DBL>(0), 4, c.n / 6 + 1, -3, 10, c.out<CDB>(0), c.slot(0));
          },
-         Band},
+         band},
         {"ReDZTH_IDP",
          [](Call &c) {
              return ReDZTH_IDP(c.spoiled<DBL>(0), 3, c.n, 5, 10, c.out<CDB>(0), Instance(c));
          },
-         Band},
+         band},
         {"CxDZTH",
          [](Call &c) {
              return CxDZTH(c.spoiled<CDB>(0), 4, c.n / 6 + 1, -3, 10, c.out<CDB>(0), c.slot(0));
          },
-         Band},
+         band},
         {"CxDZTH_IDP",
          [](Call &c) {
              return CxDZTH_IDP(c.spoiled<CDB>(0), 3, c.n, 5, 10, c.out<CDB>(0), Instance(c));
          },
-         Band},
+         band},
     };
 }
 
