@@ -62,8 +62,9 @@ int main(int argc, char **argv) {
     std::puts("GSL is not installed: apt-get install libgsl-dev");
 #endif
     qx::bench::Ratios overall("ours / fastest peer");
-    for (const auto &rows : {qx::bench::SpecialBesselRows(), qx::bench::SpecialGammaRows(),
-                             qx::bench::SpecialIntegralsRows()}) {
+    for (const auto &rows :
+         {qx::bench::SpecialBesselRows(), qx::bench::SpecialGammaRows(),
+          qx::bench::SpecialHypergeometricRows(), qx::bench::SpecialIntegralsRows()}) {
         for (const SpecialRow &row : rows) {
             if (std::strstr(row.name.c_str(), wanted) == nullptr)
                 continue;

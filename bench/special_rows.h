@@ -23,6 +23,7 @@ struct SpecialRow {
 // Each file of rows offers one of these; special.cpp runs all of them.
 std::vector<SpecialRow> SpecialBesselRows();
 std::vector<SpecialRow> SpecialGammaRows();
+std::vector<SpecialRow> SpecialHypergeometricRows();
 std::vector<SpecialRow> SpecialIntegralsRows();
 
 } // namespace qx::bench

@@ -6,6 +6,7 @@
 
 #include "qx/special_bessel.h"
 #include "qx/special_gamma.h"
+#include "qx/special_hypergeometric.h"
 #include "qx/special_integrals.h"
 
 #endif

@@ -25,7 +25,15 @@ namespace qx::test {
 constexpr double kNaN = std::numeric_limits<double>::quiet_NaN();
 constexpr double kInfinity = std::numeric_limits<double>::infinity();
 
-typedef std::array<double, 3> Arguments; // those beyond the export's own are ignored
+typedef std::array<double, 4> Arguments; // those beyond the export's own are ignored
+
+inline std::string Text(const Arguments &arguments) {
+    std::ostringstream text;
+    text.precision(17);
+    for (const double x : arguments)
+        text << ' ' << x;
+    return text.str();
+}
 
 // An export as a function of numbers that fills up to four outputs.
 typedef std::function<void(const Arguments &, double *)> Export;
@@ -86,10 +94,9 @@ inline void ExpectRule(const ExportMap &exports, const Rule &rule) {
     const double ours = Value(exports, rule.name, rule.arguments);
     const auto &a = rule.arguments;
     if (std::isnan(rule.expected))
-        EXPECT_TRUE(std::isnan(ours))
-            << rule.name << ' ' << a[0] << ' ' << a[1] << ' ' << a[2] << " gave " << ours;
+        EXPECT_TRUE(std::isnan(ours)) << rule.name << ' ' << Text(a) << " gave " << ours;
     else
-        EXPECT_EQ(ours, rule.expected) << rule.name << ' ' << a[0] << ' ' << a[1] << ' ' << a[2];
+        EXPECT_EQ(ours, rule.expected) << rule.name << ' ' << Text(a);
 }
 
 // Arguments of every kind: random bit patterns, and numbers of ordinary size, which reach more of
@@ -142,8 +149,7 @@ inline void ExpectSoon(const ExportMap &exports, int calls) {
             double time = seconds(function, arguments);
             for (int repeat = 0; repeat < 5 && time > limit; ++repeat)
                 time = std::fmin(time, seconds(function, arguments));
-            ASSERT_LE(time, limit)
-                << name << ' ' << arguments[0] << ' ' << arguments[1] << ' ' << arguments[2];
+            ASSERT_LE(time, limit) << name << ' ' << Text(arguments);
         }
     }
 }

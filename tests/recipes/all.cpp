@@ -11,6 +11,7 @@ const std::vector<Recipe> &AllRecipes() {
                  FFTRecipes(),
                  SpecialBesselRecipes(),
                  SpecialGammaRecipes(),
+                 SpecialHypergeometricRecipes(),
                  SpecialIntegralRecipes(),
                  SpectraRecipes(),
                  TransformRecipes(),

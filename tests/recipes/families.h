@@ -10,6 +10,7 @@ std::vector<Recipe> DistributionRecipes();
 std::vector<Recipe> FFTRecipes();
 std::vector<Recipe> SpecialBesselRecipes();
 std::vector<Recipe> SpecialGammaRecipes();
+std::vector<Recipe> SpecialHypergeometricRecipes();
 std::vector<Recipe> SpecialIntegralRecipes();
 std::vector<Recipe> SpectraRecipes();
 std::vector<Recipe> TransformRecipes();

@@ -1,0 +1,17 @@
+#include "special/hypergeometric.h"
+
+#include "qx/special_hypergeometric.h"
+
+#include "special/confluent.h"
+
+void QX_Gauss(double x, double a, double b, double c, DBL *value) {
+    *value = qx::Gauss(x, a, b, c, qx::kGaussPfaffBelow);
+}
+
+void QX_Gauss_2011(double x, double a, double b, double c, DBL *value) {
+    *value = qx::Gauss(x, a, b, c, qx::kGauss2011PfaffBelow);
+}
+
+void QX_Kummer(double x, double a, double b, DBL *value) { *value = qx::Kummer(x, a, b); }
+
+void QX_Tricomi(double x, double a, double b, DBL *value) { *value = qx::Tricomi(x, a, b); }

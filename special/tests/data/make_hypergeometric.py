@@ -1,0 +1,92 @@
+#!/usr/bin/python3
+"""Values by mpmath at 40 digits for special_hypergeometric_test.
+
+usage: make_hypergeometric.py > hypergeometric.txt
+"""
+
+import mpmath
+from mpmath import mpf
+from reference import row, sides
+
+
+def gauss(x, a, b, c, tolerance, names=("Gauss", "Gauss_2011"), scale=0):
+    value = mpmath.hyp2f1(mpf(a), mpf(b), mpf(c), mpf(x))
+    for name in names:
+        row(name, [x, a, b, c], 0, value, tolerance, scale)
+
+
+def kummer(x, a, b, tolerance):
+    row("Kummer", [x, a, b], 0, mpmath.hyp1f1(mpf(a), mpf(b), mpf(x)), tolerance)
+
+
+def tricomi(x, a, b, tolerance):
+    row("Tricomi", [x, a, b], 0, mpmath.hyperu(mpf(a), mpf(b), mpf(x)), tolerance)
+
+
+# Pfaff's form, the series itself, the connection; c is moderate, as the cancellation asks below 0.5.
+for a, b, c in [(0.7, 1.3, 2.25), (-0.6, 2.2, 0.9), (1.5, -2.3, -1.4), (0.25, 0.5, 3.1), (3.2, 1.7, 1.05),
+                (-0.4, -1.7, 0.6)]:
+    for x in [-1.0, -0.75, -0.2, 0.0, 1e-300, 0.1] + list(sides(-0.5)):
+        gauss(x, a, b, c, 40)
+    for x in [0.4, 0.7, 0.95, 1 - 2.0**-30] + list(sides(0.2, 0.5)):
+        gauss(x, a, b, c, 4000 if x < 0.3 else 600)
+for x in (-0.5, -0.1, 0.1):  # where the terms rise again behind the poles
+    gauss(x, 5.3, 7.2, -40.5, 400)
+gauss(-0.9, 30.5, 22.25, -41.5, 4000)
+gauss(0.15, 1000.25, 1e-18, 2.5, 4000)  # terms that begin below the tolerance and rise
+
+# c - a - b an integer: summed to 1.8e-11, which the cancellation of the two sums multiplies.
+for m in range(-4, 5):
+    for x in (0.25, 0.6, 0.95, 1 - 2.0**-40):
+        gauss(x, 0.7, 1.25, 0.7 + 1.25 + m, 4e7 if x < 0.5 else 1e6)
+        gauss(x, 1, 2, 3 + m, 4e7 if x < 0.5 else 1e6) if m > -3 else None
+gauss(0.75, 0.5, 0.5, 1 + 1e-9, 3e7)  # the limit form beside the integer
+gauss(0.75, 0.5, 0.5, 1 + 1e-8, 3e8)  # the connection next to its poles
+
+# Series that end: by a or b, with c a lower negative integer, after Euler's transformation.
+for x in (-1.0, -0.6, 0.3, 0.9, 0.999):
+    gauss(x, -5, 2.2, 0.3, 40)
+    gauss(x, 1.7, -7, -9, 40)
+    gauss(x, -3, -8, -5, 40)
+    gauss(x, -20, 21, 1, 40)  # Legendre's polynomial of degree 20, where the terms reach 1e14
+    gauss(x, 3.5, 0.75, 0.5, 40)
+    gauss(x, 0.3, 6.25, 2.25, 40)
+    gauss(x, 2.5, 1.25, 2.5, 8)
+    gauss(x, 1.25, 40, 1.25, 40)
+gauss(1.0, -5, 2.2, 0.3, 40)
+for a, b, c in [(0.7, 1.3, 2.25), (0.5, 0.5, 3), (-0.6, 2.2, 1.9), (-20.5, 33.25, 60.5), (130.5, 140.25, 400.0)]:
+    gauss(1.0, a, b, c, 4000 if c > 300 else 400)
+
+# The Bessel functions: small and large arguments, orders that are integers or not, negative orders.
+for x, a, b in [(1.5, -1.3, 2.2), (-3, 2.3, 1.1), (-3, 2.3, -1.1), (20, -30, 5.5), (-8, 3.25, 6), (12, -4, 2),
+                (-25, 7.5, 3), (1e-3, -0.5, 0.5), (40, -25.5, 2), (-0.01, 50, 1.5), (9, -60.25, 12.5)]:
+    kummer(x, a, b, 2e4)
+# Series of one sign, with cancellation, with terms that rise again behind the poles.
+for x, a, b in [(0.5, 0.7, 1.3), (10, 2.5, 0.25), (60, 3, 7), (300, 1.5, 2.5), (-2, -3.5, 1.25), (5, 1.5, -20.5),
+                (1e-200, 3, 2)]:
+    kummer(x, a, b, 200)
+for x, a, b in [(-9, 1.5, 3), (-20, 0.5, 4.25), (-30, 2.25, 7.5), (-25, -0.5, 1), (-35, 1, 9), (-40, -7.5, 0.3)]:
+    kummer(x, a, b, 60)
+kummer(50.0, -3 - 2.0**-50, 2, 2e5)  # a term almost vanishes, those behind it lead
+# The asymptotic form, on both sides.
+for x, a, b in [(-90, 0.5, 4.25), (-300, 1.5, 4), (-1e5, 2.25, 9.5), (-1e5, -1.5, 2), (-400, -3.25, 0.5),
+                (-1e300, 0.5, 2.25), (690, 4.25, 1.5), (680, -17.25, 17.5)]:
+    kummer(x, a, b, 2000)
+# Sums that end.
+for x, a, b in [(3, -2, -5), (-50, -6, 0.5), (7.5, -1, 4), (-2, -4, -7)]:
+    kummer(x, a, b, 40)
+
+for a, b in [(0.7, 0.3), (1.5, -1.25), (-2.3, 0.6), (2.2, 1.7), (3, 2.5), (-3, 0.25)]:
+    for x in (1e-10, 0.1, 1, 3, 5.9):
+        tricomi(x, a, b, 400 if x < 1 else 2e4 if x < 2 else 2e8)
+    for x in [30, 80, 1e5]:
+        tricomi(x, a, b, 1e5 if x < 50 else 20)
+for a, b in [(0.7, 0.3), (0.5, 1.25), (-0.3, 0.4), (1, 2)]:
+    for x, tolerance in [(6.0, 1e13), (7.5, 1e12), (12.0, 1e8)]:
+        tricomi(x, a, b, tolerance)
+for a, b in [(-4, 0.5), (-9, 2.25), (0.5, 4.5), (2.25, 7.25)]:  # sums that end
+    for x in (6.0, 9.0, 40.0):
+        tricomi(x, a, b, 2000)
+for a, b in [(0.7, 1), (1.5, 2), (0.25, 3), (0.3, 0), (1.25, -2)]:  # the mean beside an integer
+    for x in (0.5, 2.0, 4.0):
+        tricomi(x, a, b, 4e11)

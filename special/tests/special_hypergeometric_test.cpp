@@ -1,0 +1,214 @@
+#include "qx/special_hypergeometric.h"
+
+#include "special/confluent.h"
+#include "special/hypergeometric.h"
+#include "special/tests/exports.h"
+
+#include <gtest/gtest.h>
+
+#include <cmath>
+
+namespace {
+
+using qx::test::kInfinity;
+using qx::test::kNaN;
+
+typedef const qx::test::Arguments &In;
+
+const qx::test::ExportMap &Exports() {
+    static const qx::test::ExportMap exports = {
+        {"Gauss", [](In a, double *o) { QX_Gauss(a[0], a[1], a[2], a[3], o); }},
+        {"Gauss_2011", [](In a, double *o) { QX_Gauss_2011(a[0], a[1], a[2], a[3], o); }},
+        {"Kummer", [](In a, double *o) { QX_Kummer(a[0], a[1], a[2], o); }},
+        {"Tricomi", [](In a, double *o) { QX_Tricomi(a[0], a[1], a[2], o); }},
+    };
+    return exports;
+}
+
+double Value(const char *name, double x, double a, double b, double c = 0) {
+    return qx::test::Value(Exports(), name, {x, a, b, c});
+}
+
+TEST(SpecialHypergeometric, AgreesWithReferencesInEachForm) {
+    EXPECT_GT(qx::test::ExpectAgreement(Exports(), QX_TEST_DATA "hypergeometric.txt"), 400);
+}
+
+TEST(SpecialHypergeometric, KeepsTheRulesOfDomainsAndLimits) {
+    const qx::test::Rule rules[] = {
+        {"Gauss", {kNaN, 1, 2, 3}, kNaN},
+        {"Gauss", {0.5, kNaN, 2, 3}, kNaN},
+        {"Gauss", {0.5, 1, kInfinity, 3}, kNaN},
+        {"Gauss", {0.5, 1, 2, -kInfinity}, kNaN},
+        {"Gauss", {kInfinity, 0, 2, 3}, kNaN},
+        {"Gauss", {1.0000001, -2, 2, 3}, kNaN},
+        {"Gauss", {-1.0000001, 1, 2, 3}, kNaN},
+        {"Gauss", {1, 1, 2, 3}, kNaN},     // c = a + b
+        {"Gauss", {1, -2, 2, -0.5}, kNaN}, // also where the series ends
+        {"Gauss", {0, 1, 2, 3}, 1},
+        {"Gauss", {0.5, 0, 2, 3}, 1},
+        {"Gauss", {0.5, 1, 0, -2}, 1},
+        {"Gauss", {0.5, 1, 2, 0}, kInfinity},
+        {"Gauss", {0.5, 1, 2, -3}, kInfinity},
+        {"Gauss", {0, 1, 2, -3}, kInfinity},
+        {"Gauss", {0.5, -5, 2, -3}, kInfinity}, // ends behind the pole
+        {"Gauss", {-1, -3, 2, -3}, kInfinity},  // ends at it
+        {"Gauss", {0.5, 2, 3, 3}, 4},
+        {"Gauss", {0.5, -3, 2.5, -3}, std::pow(0.5, -2.5)}, // c = a comes before the pole
+        {"Gauss", {1, 2, -1.5, 1}, 0},                      // c - a is a pole of gamma
+        {"Gauss", {0.5, -2, 4, 4}, 0.25},
+        {"Gauss_2011", {1.5, 1, 2, 3}, kNaN},
+        {"Gauss_2011", {0.5, 1, 2, -3}, kInfinity},
+        {"Gauss_2011", {1, 1, 2, 3}, kNaN},
+        {"Kummer", {kNaN, 1, 2}, kNaN},
+        {"Kummer", {0, kNaN, 2}, kNaN},
+        {"Kummer", {0, 0, kNaN}, kNaN},
+        {"Kummer", {1, kInfinity, kInfinity}, std::exp(1.0)},
+        {"Kummer", {-kInfinity, kInfinity, -kInfinity}, 0},
+        {"Kummer", {kInfinity, kInfinity, 2}, kNaN},
+        {"Kummer", {-kInfinity, -kInfinity, 2}, kNaN},
+        {"Kummer", {3, kInfinity, 2}, kNaN},
+        {"Kummer", {3, 0, kInfinity}, 1},
+        {"Kummer", {kInfinity, 0, -kInfinity}, 1},
+        {"Kummer", {3, 2, kInfinity}, 1},
+        {"Kummer", {kInfinity, 2, 3}, kInfinity},
+        {"Kummer", {kInfinity, -2.5, 3}, kInfinity}, // kept, though the limit is -infinity
+        {"Kummer", {kInfinity, 0, 3}, 1},
+        {"Kummer", {-kInfinity, 2, 3.5}, 0},
+        {"Kummer", {0, 2, 3}, 1},
+        {"Kummer", {0, kInfinity, 3}, 1},
+        {"Kummer", {2, 0, -3}, 1},
+        {"Kummer", {2, 1.5, 1.5}, std::exp(2.0)},
+        {"Kummer", {2, -3, -3}, std::exp(2.0)},
+        {"Kummer", {2, 1, -3}, kNaN},
+        {"Kummer", {-2, -5, -3}, kNaN},
+        {"Kummer", {800, 1, 2.5}, kInfinity},
+        {"Kummer", {800, -1.5, 2.5}, kInfinity}, // gamma(-1.5) > 0
+        {"Kummer", {800, -0.5, 2.5}, -kInfinity},
+        {"Tricomi", {-1, 1, 2}, kNaN},
+        {"Tricomi", {kInfinity, 1, 2}, kNaN},
+        {"Tricomi", {1, kNaN, 2}, kNaN},
+        {"Tricomi", {1, 1, -kInfinity}, kNaN},
+        {"Tricomi", {0, 1, 2}, kInfinity},
+        {"Tricomi", {0, 1, 0.5}, kInfinity}, // kept, though the limit is finite
+        {"Tricomi", {8, 0, 2.5}, 1},
+        {"Tricomi", {8, 1.5, 2.5}, std::pow(8, -1.5)},
+    };
+    for (const auto &rule : rules)
+        qx::test::ExpectRule(Exports(), rule);
+}
+
+TEST(SpecialHypergeometric, TheVariantsOfGaussDifferOnlyBetweenTheirThresholds) {
+    for (const double x : {-0.9, -0.51, 0.2, 0.6, 0.99})
+        EXPECT_EQ(Value("Gauss", x, 0.7, 1.3, 2.25), Value("Gauss_2011", x, 0.7, 1.3, 2.25)) << x;
+    int different = 0;
+    for (double x = -0.5; x < 0.2; x += 0.01) {
+        const double elder = Value("Gauss", x, 0.7, 1.3, 2.25);
+        const double later = Value("Gauss_2011", x, 0.7, 1.3, 2.25);
+        EXPECT_NEAR(elder, later, 1e-14 * later) << x;
+        different += elder != later ? 1 : 0;
+    }
+    EXPECT_GT(different, 5);
+}
+
+TEST(SpecialHypergeometric, ParametersCountAsIntegersWithinTheTolerance) {
+    // With c = -4 only a series that ends by then has a value.
+    EXPECT_NEAR(Value("Gauss", 0.5, -3 + 1e-11, 2.5, -4), Value("Gauss", 0.5, -3, 2.5, -4), 1e-13);
+    EXPECT_EQ(Value("Gauss", 0.5, -3 + 3e-11, 2.5, -4), kInfinity);
+    EXPECT_EQ(Value("Gauss", 0.5, 0.5, 2.5, -4 + 1e-11), kInfinity);
+    EXPECT_LT(Value("Gauss", 0.5, 0.5, 2.5, -4 + 3e-11), kInfinity);
+    EXPECT_EQ(Value("Gauss", 0.5, 2.5, 3, 3 + 1e-11), std::pow(0.5, -2.5));
+    EXPECT_NE(Value("Gauss", 0.5, 2.5, 3, 3 + 3e-11), std::pow(0.5, -2.5));
+}
+
+TEST(SpecialHypergeometric, ContiguousFunctionsAndWronskiansHold) {
+    for (const double x : {-0.7, -0.3, 0.15, 0.45, 0.8}) {
+        const double a = 0.6, b = 1.35, c = 2.2; // (c-a) F(a-1) + (2a-c+(b-a)x) F = a (1-x) F(a+1)
+        for (const char *name : {"Gauss", "Gauss_2011"})
+            EXPECT_NEAR((c - a) * Value(name, x, a - 1, b, c) +
+                            (2 * a - c + (b - a) * x) * Value(name, x, a, b, c),
+                        a * (1 - x) * Value(name, x, a + 1, b, c), 1e-11)
+                << name << ' ' << x;
+    }
+    for (const double x : {-60.0, -7.0, 0.3, 4.0, 25.0}) {
+        const double a = 1.4, b = 2.3; // (b - a) M(a - 1) + (2a - b + x) M = a M(a + 1)
+        const double right = a * Value("Kummer", x, a + 1, b);
+        const double left =
+            (b - a) * Value("Kummer", x, a - 1, b) + (2 * a - b + x) * Value("Kummer", x, a, b);
+        EXPECT_NEAR(left, right, 1e-9 * std::fabs((b - a) * Value("Kummer", x, a - 1, b))) << x;
+    }
+    // M U' - M' U = -gamma(b) / gamma(a) x^(-b) exp(x), M' = a/b M(a+1, b+1), U' = -a U(a+1, b+1)
+    for (const double x : {0.2, 2.0, 5.0, 9.0, 20.0}) {
+        const double a = 0.4, b = 0.7;
+        const double wronskian =
+            -a * Value("Kummer", x, a, b) * Value("Tricomi", x, a + 1, b + 1) -
+            a / b * Value("Kummer", x, a + 1, b + 1) * Value("Tricomi", x, a, b);
+        const double expected = -std::tgamma(b) / std::tgamma(a) * std::pow(x, -b) * std::exp(x);
+        EXPECT_NEAR(wronskian / expected, 1, x > 6 && x < 15 ? 1e-4 : 1e-8) << x;
+    }
+}
+
+TEST(SpecialHypergeometric, TricomiAtAnIntegerIsTheMeanBesideIt) {
+    for (const double b : {-3.0, 0.0, 1.0, 2.00009, 4.99991}) {
+        const double mean =
+            0.5 * (Value("Tricomi", 1.5, 0.7, b - 0.0005) + Value("Tricomi", 1.5, 0.7, b + 0.0005));
+        EXPECT_EQ(Value("Tricomi", 1.5, 0.7, b), mean) << b;
+    }
+    const double beside = 0.5 * (Value("Tricomi", 1.5, 0.7, 2.00011 - 0.0005) +
+                                 Value("Tricomi", 1.5, 0.7, 2.00011 + 0.0005));
+    EXPECT_NE(Value("Tricomi", 1.5, 0.7, 2.00011), beside);
+}
+
+// Each method alone, on arguments where it holds: its value, and an estimate that covers the error.
+TEST(SpecialHypergeometric, MethodsOfKummerKnowTheirError) {
+    typedef qx::KummerEstimate (*Method)(double, double, double);
+    struct Case {
+        Method method;
+        double a, b, x;
+        double expected; // mpmath at 30 digits
+    };
+    const Case cases[] = {
+        {qx::KummerBessel, -1.3, 2.2, 1.7, 0.08429675511524970},
+        {qx::KummerBessel, 2.3, 1.1, -13, 0.0009007924613400791},
+        {qx::KummerBessel, -30, 5.5, 20, -0.01429232817876630},
+        {qx::KummerSeries, 2.3, -1.1, -3, -3.998472692684525},
+        {qx::KummerSeries, 12.3, -11.3, -3, 75.19962406673630},
+        {qx::KummerAsymptotic, 2.3, 1.1, -60, 1.7427123382991406e-5},
+        {qx::KummerAsymptotic, -1.6, 0.9, -35, 253.87662577154988},
+        {qx::KummerAsymptotic, 0.75, 2.5, 300, 9.758236105587669e125},
+    };
+    for (const Case &c : cases) {
+        const qx::KummerEstimate estimate = c.method(c.a, c.b, c.x);
+        EXPECT_LE(std::fabs(estimate.value / c.expected - 1), estimate.error + 1e-13) << c.x;
+        EXPECT_LT(estimate.error, 1e-11) << c.x;
+    }
+    for (const double a : {2.0, -2.0}) { // the Bessel functions refuse b = 2 a, equal signs
+        EXPECT_GT(qx::KummerBessel(a, 2 * a, -a).error, 1e30);
+        EXPECT_GT(qx::KummerBessel(a, 0.5 * a, a).error, 1e30);
+        EXPECT_GT(qx::KummerBessel(a, 2.5 * a, -a).error, 1e30); // (2 b - 4 a) x < 0
+    }
+}
+
+TEST(SpecialHypergeometric, ReturnsSoonForAnyArgument) {
+    // Most bit patterns lie outside [-1, 1], so there are forms that fold x into it, and towards 1.
+    qx::test::ExportMap exports = Exports();
+    exports["Gauss"] = [](In a, double *o) { QX_Gauss(std::fmod(a[0], 1.0), a[1], a[2], a[3], o); };
+    exports["GaussNear1"] = [](In a, double *o) {
+        QX_Gauss(std::copysign(1 - std::exp2(-std::fabs(a[0])), a[0]), a[1], a[2], a[3], o);
+    };
+    qx::test::ExpectSoon(exports, 1000000);
+}
+
+TEST(SpecialHypergeometric, LeavesNoStepAtAThreshold) {
+    const qx::test::Seam seams[] = {
+        {"Gauss", {-0.5, 0.7, 1.3, 2.25}, 0, 1e-14},
+        {"Gauss", {0.2, 0.7, 1.3, 2.25}, 0, 1e-13},
+        {"Gauss_2011", {0.2, 0.7, 1.3, 2.25}, 0, 1e-13},
+        {"Kummer", {-50, 1.5, 6.25}, 0, 1e-11},
+        {"Tricomi", {6, 0.4, 0.7}, 0, 1e-6},
+        {"Tricomi", {1.5, 0.4, 1.0001}, 2, 1e-5},
+    };
+    for (const auto &seam : seams)
+        qx::test::ExpectNoStep(Exports(), seam);
+}
+
+} // namespace
