@@ -135,6 +135,7 @@ TEST(BandTransform, TheInnerRoutineChecksItsPlan) {
     EXPECT_EQ(run(nullptr, 8, 2, 0), ErrFFTSizeNotPositive);
     EXPECT_EQ(run(nullptr, 8, 2, 4), ErrInternal);
     EXPECT_EQ(run(plan, 8, 2, 3), ErrInternal);
+    EXPECT_EQ(x, RandomSignal(8)) << "before the input is folded";
     EXPECT_EQ(run(plan, 8, 2, 4), 0);
     qx::destroy_oxfft_table(plan);
 }
