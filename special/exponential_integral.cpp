@@ -2,7 +2,9 @@
 
 #include "stats/gamma.h"
 
+#include <array>
 #include <cmath>
+#include <cstddef>
 #include <limits>
 
 namespace qx {
@@ -26,36 +28,58 @@ double Expansion(double x, double n) {
     return std::exp(-x) * (1 + y * (n + y * ((n - 2 * x) * n + last))) / k;
 }
 
-// x + n / (1 + 1 / (x + (n + 1) / (1 + 2 / (x + ...)))), inverted.
-double ContinuedFraction(double x, double n) {
-    double p1 = 1, q1 = x;
-    double p2 = 1, q2 = n + x;
-    double value = 1 / (n + x);
-    double change = 1;
-    for (int i = 2; change > kEps; ++i) {
-        const bool isEven = i % 2 == 0;
-        const double v = isEven ? i / 2 : n + (i - 1) / 2;
-        const double factor = isEven ? x : 1;
-        const double p = p1 * v + p2 * factor;
-        const double q = q2 * factor + v * q1;
-        change = 1;
-        if (q != 0) {
-            const double next = p / q;
-            change = std::fabs((value - next) / next);
-            value = next;
-        }
+// The convergents of x + n / (1 + 1 / (x + (n + 1) / (1 + 2 / (x + ...)))), inverted.
+struct Convergents {
+    double p1, q1, p2, q2;
+    double value;
+    double difference;
+
+    void take(double p, double q) { // both positive, as all terms are
+        const double next = p / q;
+        difference = std::fabs(value - next);
+        value = next;
         p1 = p2;
         q1 = q2;
         p2 = p;
         q2 = q;
-        if (std::fabs(p) > kBig) {
+        if (p > kBig) {
             p1 *= kInverseBig;
             q1 *= kInverseBig;
             p2 *= kInverseBig;
             q2 *= kInverseBig;
         }
     }
-    return value * std::exp(-x);
+    bool haveSettled() const { return difference <= kEps * value; }
+};
+
+double ContinuedFraction(double x, double n) {
+    Convergents c = {1, x, 1, n + x, 1 / (n + x), 0};
+    for (double k = 1;; k += 1) {
+        c.take(c.p1 * k + c.p2 * x, c.q1 * k + c.q2 * x);
+        if (c.haveSettled())
+            break;
+        const double v = n + k;
+        c.take(c.p1 * v + c.p2, c.q1 * v + c.q2);
+        if (c.haveSettled())
+            break;
+    }
+    return c.value * std::exp(-x);
+}
+
+// 1 + 1 / 2 + ... + 1 / k, by k.
+constexpr auto kHarmonic = [] {
+    std::array<double, kWithoutLogarithm> sums = {};
+    for (std::size_t k = 1; k < sums.size(); ++k)
+        sums[k] = sums[k - 1] + 1.0 / static_cast<double>(k);
+    return sums;
+}();
+
+// (-x)^(n - 1) (psi(n) - ln x) / (n - 1)!, n < 170.
+double LogarithmicTerm(double x, int32_t n) {
+    const double psi = -kEuler - std::log(x) + kHarmonic[static_cast<std::size_t>(n - 1)];
+    if (n <= 2)
+        return n == 1 ? psi : -x * psi;
+    return std::pow(-x, n - 1) * psi / GammaFunction(n);
 }
 
 double PowerSeries(double x, int32_t n) {
@@ -65,17 +89,14 @@ double PowerSeries(double x, int32_t n) {
     double sum = n == 1 ? 0 : 1 / p;
     do {
         k += 1;
-        term = term * -x / k;
+        term *= -x / k;
         p += 1;
         if (p != 0)
             sum += term / p;
-    } while (sum == 0 || std::fabs(term / sum) > kEps);
+    } while (sum == 0 || std::fabs(term) > kEps * std::fabs(sum));
     if (n >= kWithoutLogarithm)
         return -sum; // kept: the first term no longer counts
-    double psi = -kEuler - std::log(x);
-    for (int32_t i = 1; i < n; ++i)
-        psi += 1.0 / i;
-    return std::pow(-x, n - 1) * psi / GammaFunction(n) - sum;
+    return LogarithmicTerm(x, n) - sum;
 }
 
 } // namespace
