@@ -60,7 +60,7 @@ for n in (0, 1):
     # two ranges, since the terms of one would exceed its value at the ends by far
     for label, a, b, p, q in (("Low", 0, 16, 6, 5), ("Mid", 16, 64, 8, 6)):
         t.add(f"y{n}{label}", f"(Y{n}(x) - 2/pi ln x J{n}(x) + [n = 1] 2/(pi x)) / x^{n} in z = x^2",
-              y_part(n), a, b, p, q, shift=2, middle=a > 0)
+              y_part(n), a, b, p, q, shift=2, centre=mpf(a + b) / 2 if a else None)
     # two ranges of z = 1 / x^2
     for label, a, b, p, q in (("Mid", mpf(1) / 400, mpf(1) / 64, 5, 5), ("Far", mpf(10)**-10, mpf(1) / 400, 4, 4)):
         t.add(f"{name}Phase{label}Cos", f"P of order {n} in z = 1 / x^2", modulus(n, "P"), a, b, p, q)

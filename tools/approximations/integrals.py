@@ -30,7 +30,7 @@ def dilogarithm(folder):
     t = Table("integrals.py", "QX_SPECIAL_TABLES_DILOGARITHM_H")
     t.add("dilogarithm", "-Li2(-w) / w in w", lambda w: -polylog(2, -w).real / w if w else mpf(1),
           -mpf(1) / 2, mpf(1) / 2, 7, 7,
-          LOGARITHM_FROM_ONE)
+          LOGARITHM_FROM_ONE, centre=-mpf(1) / 2)  # all powers positive, so that nothing cancels
     t.write(folder + "dilogarithm.h")
 
 

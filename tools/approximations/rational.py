@@ -40,7 +40,7 @@ def solve(points, function, p, q):
     return [s[j] for j in range(p + 1)], [mpf(1)] + [s[p + 1 + j] for j in range(q)]
 
 
-def fits(function, a, b, p, q, warp, middle):
+def fits(function, a, b, p, q, warp, centre):
     """(centre, exact coefficients, coefficients as doubles), in several ways of rounding.
 
     The coefficients are in powers of the distance from the centre. Either all are rounded, or the
@@ -54,7 +54,8 @@ def fits(function, a, b, p, q, warp, middle):
         if x not in values:
             values[x] = function(x)
         return values[x]
-    for centre in (as_double((a + b) / 2),) + (() if middle else (mpf(0),)):
+    candidates = (as_double((a + b) / 2), mpf(0)) if centre is None else (as_double(centre),)
+    for centre in candidates:
         def points(n):
             return [unwarp(x) - centre for x in nodes(low, high, n)]
         exact = solve(points(p + q + 1), lambda h: known(h + centre), p, q)
@@ -118,14 +119,15 @@ class Table:
             line = line[cut + 1:]
         self.lines.append("// " + line)
 
-    def add(self, name, what, function, a, b, p, q, warp=PLAIN, weight=lambda x: 1, shift=0, middle=False):
+    def add(self, name, what, function, a, b, p, q, warp=PLAIN, weight=lambda x: 1, shift=0,
+            centre=None):
         """With a shift the fit and the error are those of function + shift, which then has no zero.
-        With `middle` the centre is that of the interval, since about 0 the terms would cancel."""
+        The centre is given where about 0, or the middle of the interval, the terms would cancel."""
         a, b = mpf(a), mpf(b)
         best = None
         plain = function
         function = (lambda x: plain(x) + shift) if shift else plain
-        for centre, exact, rounded in fits(function, a, b, p, q, warp, middle):
+        for centre, exact, rounded in fits(function, a, b, p, q, warp, centre):
             try:
                 worst = errors(function, a, b, centre, [exact, rounded], weight, 41)
             except ArithmeticError:
