@@ -1,5 +1,6 @@
 #include "special/beta.h"
 
+#include "special/digamma.h"
 #include "special/extended.h"
 #include "special/rational.h"
 #include "special/reciprocal_gamma.h"
@@ -91,7 +92,11 @@ double CompleteBeta(double a, double b) {
         return kNaN;
     if (a > 0 && b > 0)
         return a > b ? OfPositive(a, b) : OfPositive(b, a);
-    return GammaFunction(a) * GammaFunction(b) * ReciprocalGamma(a + b);
+    const Extended s = ExactSum(a, b);
+    double reciprocal = ReciprocalGamma(s.high);
+    if (s.low != 0 && !IsInteger(s.high)) // beside a pole of gamma the rounding of the sum counts
+        reciprocal -= reciprocal * (s.low * Digamma(s.high));
+    return GammaFunction(a) * GammaFunction(b) * reciprocal;
 }
 
 } // namespace qx

@@ -46,7 +46,8 @@ BETA = [("a, b in [0.1, 10]", product(linear(0.1, 10, 8), linear(0.1, 10, 7))),
         ("a in [10, 1000], b in [0.1, 10]", product(logarithmic(10, 1000, 8), linear(0.1, 10, 7))),
         ("a, b in [10, 500]", product(logarithmic(10, 500, 8), logarithmic(10, 500, 7))),
         ("a in [1e3, 1e15], b in [1e-10, 5]", product(logarithmic(1e3, 1e15, 10), logarithmic(1e-10, 5, 7))),
-        ("tiny", product(logarithmic(1e-300, 1e-8, 6), logarithmic(1e-300, 1, 6)))]
+        ("tiny", product(logarithmic(1e-300, 1e-8, 6), logarithmic(1e-300, 1, 6))),
+        ("a in [-20, 0], b in [-20, 10]", product(linear(-19.7, -0.3, 8), linear(-19.45, 9.2, 7)))]
 
 
 def incomplete_beta(parameters):

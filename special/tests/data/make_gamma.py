@@ -19,6 +19,9 @@ for a in (1e-300, 1e-9, 0.5, 1.0, 2.5, 10.0, 33.5, 100.0, 171.0, 1e4, 1e9):
         # the exponents have.
         size = sum(abs(mpmath.loggamma(mpf(v))) for v in (a, b, a + b))
         row("BetaComplete", [a, b], 0, value, 40 + (2 * size if a + b > 100 else 0))
+for a, b in [(-2.5, 1.25), (-4.8178181157026057, -19.159449570182726), (-0.3, -0.7 + 2.0**-40), (3.2563498815717686, -17.5)]:
+    # beside the poles of gamma(a + b) the rounding of the sum would count a thousandfold
+    row("BetaComplete", [a, b], 0, mpmath.beta(mpf(a), mpf(b)), 16)
 for a, b, x in [(2.0, 3.0, 0.3), (0.5, 0.5, 0.999), (1.0, 7.0, 0.2), (12.5, 4.0, 0.75), (1e-3, 5.0, 1e-6)]:
     row("Beta", [a, b, x], 0, mpmath.betainc(mpf(a), mpf(b), 0, mpf(x), regularized=True), 200, 0.1)
 
