@@ -1,5 +1,6 @@
 #include "stats/gamma.h"
 
+#include <algorithm>
 #include <cmath>
 #include <limits>
 #include <numbers>
@@ -11,6 +12,7 @@ namespace {
 constexpr double epsilon = 2.220446049250313e-16;
 constexpr double big = 1.4411518807585587e+17;       // 2^57
 constexpr double inverseBig = 6.938893903907228e-18; // 2^-57
+constexpr double endOfIntegers = 9007199254740992.0; // 2^53, from where x + 1 is rounded to x
 constexpr double infinity = std::numeric_limits<double>::infinity();
 constexpr double quietNaN = std::numeric_limits<double>::quiet_NaN();
 constexpr double pi = std::numbers::pi;
@@ -246,7 +248,9 @@ double IncompleteGammaP(double a, double x) {
         return infinity; // kept: not NaN
     const double front = std::exp(log);
     if (front == 0.0)
-        return 0.0; // whatever the sum, which is finite
+        return 0.0;         // whatever the sum, which is finite
+    if (a >= endOfIntegers) // the terms no longer fall but as powers of x / a
+        return front / std::max(1.0 - x / a, epsilon) / a;
     double r = a;
     double term = 1.0;
     double sum = 1.0;

@@ -29,7 +29,9 @@ double StirlingGamma(double x);
 
 // The regularised lower and upper incomplete gamma functions P(a, x) and Q(a, x): the series up
 // to max(1, a), the continued fraction beyond. Both loops run until they have converged; near
-// x = a that takes about 6 sqrt(a) terms, which is long where a exceeds 1e9.
+// x = a that takes a number of terms in proportion to sqrt(a): below a millisecond up to a = 1e9,
+// 0.1 s at 1e14, 1 s towards 2^53, from where the series, then geometric, has a closed form. The
+// factor before them has by then lost its digits to the rounding of its logarithm.
 double IncompleteGammaP(double a, double x);
 double IncompleteGammaQ(double a, double x);
 

@@ -126,6 +126,16 @@ TEST(SpecialGamma, RecurrencesAndReflectionsHold) {
         EXPECT_NEAR(Value("Fact", n), n * Value("Fact", n - 1), 2.3e-16 * Value("Fact", n)) << n;
 }
 
+// Where adding 1 leaves the shape as it is, the terms of the series fall as slowly as its closeness
+// to x lets them: not at all, or for longer than anyone waits.
+TEST(SpecialGamma, ReturnsSoonForShapesBeyondTheIntegers) {
+    for (const double a : {9007199254740992.0, 3e17, 2.4803007478524029e+65, 1e300})
+        for (const double x : {a, a * (1 - 1e-12), a * (1 - 1e-6)}) {
+            EXPECT_GE(Value("GammaP", a, x), 0) << a << ' ' << x;
+            EXPECT_FALSE(Value("GammaC", a, x) > 1) << a << ' ' << x; // NaN after an overflow
+        }
+}
+
 TEST(SpecialGamma, ReturnsSoonForAnyArgument) { qx::test::ExpectSoon(Exports(), 1000000); }
 
 TEST(SpecialGamma, LeavesNoStepAtAThreshold) {
