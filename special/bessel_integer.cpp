@@ -96,32 +96,46 @@ ScaledK KScaled(double x) {
     return {table::k0Far(u) / root, table::k1Far(u) / root};
 }
 
-// J_n / J_{n-1} for n > x by its continued fraction, modified Lentz's method
-// (W. J. Lentz, Applied Optics 15, 1976). For n > x a few dozen terms serve; near n = x they grow
-// as the cube root of n.
-double RatioOfJ(double n, double x) {
-    constexpr double tiny = 1e-300;
-    constexpr double eps = 1.1102230246251565e-16;
-    double b = 2 * n / x;
-    double f = b;
-    double c = b;
-    double d = 0;
-    for (int i = 1; i < 2000; ++i) {
-        b = 2 * (n + i) / x;
-        d = b - d;
-        c = b - 1 / c;
-        if (d == 0)
-            d = tiny;
-        if (c == 0)
-            c = tiny;
-        d = 1 / d;
-        const double factor = c * d;
-        f *= factor;
-        if (std::fabs(factor - 1) <= eps)
-            break;
+// f_(k+1) = (2 k / x) f_k - f_(k-1) for k below 2^20, upward, or downward with f_(k-1) and f_(k+1)
+// exchanged. Two hundred steps would lose a digit to rounding, so what each step rounds away is
+// carried along in a recurrence of its own.
+class Recurrence {
+public:
+    Recurrence(double x, double before, double value) : before_(before), value_(value) {
+        constexpr double splitter = 134217729.0; // 2^27 + 1
+        const Extended ratio = Extended{2, 0} / Extended{x, 0};
+        const double t = splitter * ratio.high;
+        ratio_ = ratio.high;
+        ratioHead_ = t - (t - ratio.high);
+        ratioRest_ = (ratio.high - ratioHead_) + ratio.low;
     }
-    return 1 / f;
-}
+
+    void step(double k) {
+        const double c = k * ratio_;
+        const double restOfC = (k * ratioHead_ - c) + k * ratioRest_;
+        const Extended product = ExactProduct(c, value_);
+        const Extended next = ExactSum(product.high, -before_);
+        const double rest =
+            (product.low + next.low) + ((restOfC * value_ + c * restOfValue_) - restOfBefore_);
+        before_ = value_;
+        restOfBefore_ = restOfValue_;
+        value_ = next.high;
+        restOfValue_ = rest;
+    }
+
+    double before() const { return Corrected(before_, restOfBefore_); }
+    double value() const { return Corrected(value_, restOfValue_); }
+
+private:
+    // Next to the ends of the range the rest is lost, but the value is not.
+    static double Corrected(double value, double rest) {
+        return std::isfinite(rest) ? value + rest : value;
+    }
+
+    double ratio_, ratioHead_, ratioRest_; // 2 / x
+    double before_, value_;
+    double restOfBefore_ = 0, restOfValue_ = 0;
+};
 
 } // namespace
 
@@ -181,14 +195,10 @@ double BesselJn(double n, double x) {
     if (n >= kUniformFrom)
         return BesselLargeOrder(n, x).j;
     if (n <= x) {
-        double before = BesselJ0(x);
-        double value = BesselJ1(x);
-        for (double k = 1; k < n; k += 1) {
-            const double next = 2 * k / x * value - before;
-            before = value;
-            value = next;
-        }
-        return value;
+        Recurrence j(x, BesselJ0(x), BesselJ1(x));
+        for (double k = 1; k < n; k += 1)
+            j.step(k);
+        return j.value();
     }
     if (x * x < n + 1) { // the ascending series falls from its first term on
         const double quarter = -0.25 * x * x;
@@ -200,17 +210,18 @@ double BesselJn(double n, double x) {
         }
         return PowerOverGamma(0.5 * x, n) * sum;
     }
-    // downward, from J_n = r and J_{n-1} = 1
-    double above = RatioOfJ(n, x);
-    const double start = above;
-    double value = 1;
-    for (double k = n - 1; k > 0; k -= 1) {
-        const double below = 2 * k / x * value - above;
-        above = value;
-        value = below;
-    }
-    return std::fabs(value) > std::fabs(above) ? start / value * BesselJ0(x)
-                                               : start / above * BesselJ1(x);
+    // Downward from an order where J has fallen so far that the trial values 0 and 1 there leave
+    // 1e-18 of Y at n; the fall is slowest, that of Airy's function, next to n = x.
+    const double start = n + std::floor(10 * std::cbrt(0.5 * x)) + 3;
+    Recurrence j(x, 0, 1);
+    double k = start - 1;
+    for (; k > n; k -= 1)
+        j.step(k);
+    const double wanted = j.value();
+    for (; k > 0; k -= 1)
+        j.step(k);
+    return std::fabs(j.value()) > std::fabs(j.before()) ? wanted / j.value() * BesselJ0(x)
+                                                        : wanted / j.before() * BesselJ1(x);
 }
 
 double BesselYn(double n, double x) {
@@ -224,13 +235,11 @@ double BesselYn(double n, double x) {
         return BesselY1(x);
     if (n >= kUniformFrom)
         return BesselLargeOrder(n, x).y;
-    double before = BesselY0(x);
-    double value = BesselY1(x);
-    for (double k = 1; k < n && std::isfinite(value); k += 1) {
-        const double next = 2 * k / x * value - before;
-        before = value;
-        value = next;
-    }
+    const double scale = n > x ? 0x1p-512 : 1; // where Y grows, away from the end of the range
+    Recurrence y(x, scale * BesselY0(x), scale * BesselY1(x));
+    for (double k = 1; k < n && std::isfinite(y.value()); k += 1)
+        y.step(k);
+    const double value = y.value() / scale;
     return std::isfinite(value) ? value : -kInfinity;
 }
 

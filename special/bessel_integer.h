@@ -17,9 +17,10 @@ double BesselJ1(double x);
 double BesselY0(double x); // -infinity at 0
 double BesselY1(double x);
 
-// Larger orders. J: upward recurrence while n <= x, where it is stable; below, the continued
-// fraction of J_n / J_{n-1} and downward recurrence to the larger of J0 and J1. Y: upward. From
-// order 200 on both come from the expansions for large order, which bounds the work.
+// Larger orders. J: upward recurrence while n <= x, where it is stable; below, downward
+// recurrence from a higher order to the larger of J0 and J1 (Miller's method). Y: upward. The
+// recurrences carry their rounding errors along. From order 200 on both come from the expansions
+// for large order, which bounds the work.
 double BesselJn(double n, double x);
 double BesselYn(double n, double x);
 
