@@ -9,6 +9,7 @@ import time
 import unittest
 import warnings
 from pathlib import Path
+from unittest import mock
 
 import numpy as np
 
@@ -60,6 +61,11 @@ class Arrays(unittest.TestCase):
             self.assertIsNot(arrays.filled(other, "DBL", 1, "x", reuse=True), whole.base)
         self.assertIsNot(arrays.filled(whole, "DBL", 1, "x", reuse=False), whole.base)
         self.assertEqual(qx.call("Mean_head", part), kept[5:].mean())
+        # A square turned about its diagonal has the shape and the address of its block, too.
+        square = qx.call("DCT_2DH", np.arange(9.0).reshape(3, 3), 0, 0)
+        self.assertIsNot(arrays.filled(square.T, "DBL", 2, "x", reuse=True), square.base)
+        np.testing.assert_allclose(qx.call("InvDCT_2DH", square.T),
+                                   np.arange(9.0).reshape(3, 3).T, atol=1e-14)
 
     def test_what_would_lose_its_meaning_is_refused(self):
         for name, values, error, reason in (
@@ -70,6 +76,8 @@ class Arrays(unittest.TestCase):
                 ("Moment_head", [[1.0], 1.5], TypeError, "whole number"),
                 ("Moment_head", [[1.0], "2"], TypeError, "whole number"),
                 ("Moment_head", [[1.0], 2**31], ValueError, "outside"),
+                ("Contingency_head", [[[1, 2], [3, 2**31]]], ValueError, "outside"),
+                ("Mean_head", [np.broadcast_to(0.0, 2**31)], ValueError, "more than an array"),
                 ("Moment_head", [[1.0]], TypeError, r"moment = qx.call\(\"Moment_head\", x, order\)"),
                 ("Moment_hed", [[1.0], 2], LookupError, "did you mean Moment_head")):
             with self.subTest(name=name, values=values):
@@ -134,6 +142,49 @@ class Concurrency(unittest.TestCase):
 
 
 class Plans(unittest.TestCase):
+    def setUp(self):
+        qx.release()
+        self.released = []
+        release = plans.Word.release
+        patch = mock.patch.object(plans.Word, "release",
+                                  lambda word: (self.released.append(word), release(word)))
+        patch.start()
+        self.addCleanup(patch.stop)
+
+    @staticmethod
+    def transform(n):
+        qx.call("ReOXFFTH80", np.ones(4), 0, n, 0)
+
+    def test_the_latest_are_kept_and_the_others_released(self):
+        cache = plans._per_thread.cache
+        self.transform(1)
+        first = next(iter(cache.words.values()))
+        for n in range(2, plans.KEPT_PER_THREAD + 1):
+            self.transform(n)
+        second = list(cache.words.values())[1]
+        self.assertEqual(self.released, [])
+        self.transform(1)  # used again: the plan of length 2 is now the oldest
+        self.transform(1000)
+        self.assertEqual(self.released, [second])
+        self.assertIsNone(second.value.value)
+        self.assertIn(first, cache.words.values())
+
+    def test_each_thread_has_its_own_until_it_ends(self):
+        self.transform(5)
+        words = []
+
+        def work():
+            self.transform(5)
+            words.extend(plans._per_thread.cache.words.values())
+
+        thread = threading.Thread(target=work)
+        thread.start()
+        thread.join()
+        gc.collect()
+        self.assertEqual(len(words), 1)
+        self.assertNotIn(words[0], plans._per_thread.cache.words.values())
+        self.assertEqual(self.released, words)
+
     def test_transforms_keep_their_plans(self):
         rng = np.random.default_rng(3)
         qx.release()
@@ -158,6 +209,10 @@ class Plans(unittest.TestCase):
         before = h.copy()
         first = qx.call("InvReOXFFTHCH", h)
         np.testing.assert_array_equal(h, before)
+        view = qx.call("DCT_1DH", h, 0)  # a view of a block that an input would take as it is
+        before = view.copy()
+        qx.call("SpectrumH", view)
+        np.testing.assert_array_equal(view, before)
         second = qx.call("InvReOXFFTHCH", h)
         np.testing.assert_array_equal(first[1], second[1])
 

@@ -59,11 +59,18 @@ class Reading(InFolder):
                 ("t;u (mV)\n0;1,5\n0,5;2,5\n1;3,5\n", [1.5, 2.5, 3.5], 2, "mV"),
                 ("time [ms],x\n0,4\n2,5\n4,6\n", [4, 5, 6], 500, ""),
                 ("\ufeffvalue\r\n1\r\n\r\n2\r\n", [1, 2], None, ""),
+                ("time [min],x\n0,4\n1,5\n", [4, 5], 1 / 60, ""),
+                ("t,x\n0,4\n1,5\n3,6\n", [4, 5, 6], None, ""),  # uneven times
+                ("t,x\n0,4\n0,5\n", [4, 5], None, ""),  # times that stand still
+                ("# sampling rate: 2.5k\n1\n", [1], 2500, ""),
                 ("1 10\n2 20\n", [1, 2], None, "")):
             with self.subTest(text=text):
                 read = recording.read(self.file(text))
                 np.testing.assert_allclose(read.values, values)
                 self.assertEqual((read.rate, read.unit), (rate, unit))
+        for encoding in ("utf-16", "latin-1"):
+            read = recording.read(self.file("# 5 Hz, °C\n1\n2\n".encode(encoding)))
+            self.assertEqual((read.values.tolist(), read.notes), ([1, 2], ["5 Hz, °C"]))
         two = self.file("a,b\n1,2\n3,4\n")
         self.assertEqual(recording.read(two, column="b").values.tolist(), [2, 4])
         self.assertEqual(recording.read(two, column="2").values.tolist(), [2, 4])
@@ -81,6 +88,10 @@ class Reading(InFolder):
             with self.subTest(form=form, bits=bits):
                 read = recording.read(self.file(wav(samples, form, bits), "a.wav"))
                 self.assertEqual((read.values.tolist(), read.rate), ([0, 0.5, -1], 8000))
+        extensible = wav([struct.pack("<h", 16384)], 0xFFFE)
+        extensible = extensible.replace(b"fmt \x10\0\0\0", b"fmt \x1a\0\0\0").replace(
+            b"LIST", b"\x08\0\x10\0\x04\0\0\0\x01\0LIST")
+        self.assertEqual(recording.read(self.file(extensible)).values.tolist(), [0.5])
         stereo = wav([struct.pack("<hh", 0, 16384)] * 2, channels=2)
         self.assertEqual(recording.read(self.file(stereo), column="2").values.tolist(), [0.5, 0.5])
 
@@ -89,7 +100,7 @@ class Reading(InFolder):
         for content, reason in (
                 ("", "is empty"), ("# only\n\n", "holds no numbers"), ("a\nb\n", "holds no numbers"),
                 ("1\n2\nnan\n", ":3: 'nan' is not a finite"), ("v\n1\n-inf\n", ":3: '-inf' is not"),
-                ("1\n# c\nx2\n", ":3: 'x2' is not a number"), ("t,u\n0,1\n1,\n", ":3: column 2"),
+                ("1\n# c\nx2\n", ":3: 'x2' is not a number"), ("1\n2_0\n", ":2: '2_0' is not"), ("t,u\n0,1\n1,\n", ":3: column 2"),
                 (b"\x7fELF\x01\0\0", ":1: neither"),
                 (b"1\n2\n\x00\n", ":3: neither"), (b"RIFF\0\0\0\0WAVE", "no format"),
                 (wav([]), "no samples"), (wav([b"\0\0"], form=85), "cannot be read"),
@@ -108,6 +119,9 @@ class Reading(InFolder):
             code, _, err = run("report", *arguments)
             self.assertEqual((code, err.count("\n")), (2, 1))
             self.assertIn(reason, err)
+        for rate in ("0", "-1", "nan", "inf", "x"):
+            with contextlib.redirect_stderr(io.StringIO()), self.assertRaises(SystemExit):
+                command.arguments(["report", "a.csv", f"--rate={rate}"])
 
 
 class Report(InFolder):
@@ -120,7 +134,8 @@ class Report(InFolder):
         expected = {"Mean": x.mean(), "Root mean square": np.sqrt(np.mean(x * x)),
                     "Median": np.median(x), "Central moment of order 2": np.mean(d**2),
                     "Central moment of order 3": np.mean(d**3),
-                    "Central moment of order 4": np.mean(d**4)}
+                    "Central moment of order 4": np.mean(d**4),
+                    "Skewness": np.mean(d**3) / d.std()**3, "Kurtosis": np.mean(d**4) / d.std()**4}
         for label, value in expected.items():
             shown = re.search(rf"^  {label} +(\S+)", out, re.MULTILINE)
             self.assertIsNotNone(shown, label)
@@ -135,6 +150,14 @@ class Report(InFolder):
         for figure in figures:
             xml.etree.ElementTree.fromstring(figure)
 
+    def test_shows_what_a_file_says_as_text(self):
+        path = self.file("# <script>note</script>\n<b>force</b>\n1\n2\n", "a & b.csv")
+        self.assertEqual(run("report", path, "--output", self.folder)[0], 0)
+        text = (self.folder / "report.html").read_text("utf-8")
+        self.assertNotRegex(text, "<script>|<b>force")
+        self.assertIn("<h1>a &amp; b.csv</h1>", text)
+        self.assertIn("&lt;script&gt;note", text)
+
     def test_of_data_without_spread_and_of_one_sample(self):
         for text in ("7\n", "7\n7\n7\n", "1e300\n-1e300\n", "0\n", "1e100\n" + 20 * "-2e99\n"):
             with self.subTest(text=text):
@@ -147,12 +170,22 @@ class Spectra(unittest.TestCase):
     def test_a_sinusoid_has_its_amplitude(self):
         for n in (100, 101):
             x = 3 + 0.5 * np.cos(2 * np.pi * 7 * np.arange(n) / n + 0.3)
+            if n % 2 == 0:
+                x += 0.25 * np.cos(np.pi * np.arange(n))
             frequencies, amplitudes = report.amplitude_spectrum(
                 recording.Recording("", x, None, "", "", "", []))
             expected = np.zeros(n // 2 + 1)
             expected[[0, 7]] = 3, 0.5
+            if n % 2 == 0:
+                expected[n // 2] = 0.25  # no second side to add
             np.testing.assert_allclose(amplitudes, expected, atol=1e-13)
             self.assertAlmostEqual(frequencies[7], 7 / n)
+
+    def test_the_strongest_parts_are_apart(self):
+        values = np.array([5, 9, 8, 0, 7, 1.0])
+        found = report.strongest(np.arange(6) / 10, values, 3, 0.15)
+        self.assertEqual([int(i) for i in found], [1, 4])
+        self.assertEqual(report.strongest(np.arange(6) / 10, 0 * values, 3, 0.15), [])
 
     def test_the_averaged_spectrum_is_a_density(self):
         x = np.random.default_rng(4).normal(size=1000)
