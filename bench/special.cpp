@@ -61,10 +61,16 @@ int main(int argc, char **argv) {
 #else
     std::puts("GSL is not installed: apt-get install libgsl-dev");
 #endif
-    qx::bench::Ratios overall("ours / fastest peer");
-    for (const auto &rows :
-         {qx::bench::SpecialBesselRows(), qx::bench::SpecialGammaRows(),
-          qx::bench::SpecialHypergeometricRows(), qx::bench::SpecialIntegralsRows()}) {
+    const std::pair<const char *, std::vector<SpecialRow>> groups[] = {
+        {"Bessel functions and their kin", qx::bench::SpecialBesselRows()},
+        {"gamma family, distributions", qx::bench::SpecialGammaRows()},
+        {"hypergeometric functions", qx::bench::SpecialHypergeometricRows()},
+        {"error function, integrals", qx::bench::SpecialIntegralsRows()},
+    };
+    std::vector<qx::bench::Ratios> ratios;
+    qx::bench::Ratios overall("all");
+    for (const auto &[name, rows] : groups) {
+        ratios.emplace_back(name);
         for (const SpecialRow &row : rows) {
             if (std::strstr(row.name.c_str(), wanted) == nullptr)
                 continue;
@@ -79,10 +85,15 @@ int main(int argc, char **argv) {
                 fastest = std::min(fastest, times[k]);
             }
             std::puts("");
-            if (times.size() > 1)
+            if (times.size() > 1) {
+                ratios.back().add(times[0] / fastest);
                 overall.add(times[0] / fastest);
+            }
         }
     }
+    std::puts("ours / fastest peer");
+    for (const auto &group : ratios)
+        group.print();
     overall.print();
     return 0;
 }
