@@ -42,6 +42,7 @@ for m in range(-4, 5):
         gauss(x, 1, 2, 3 + m, 4e7 if x < 0.5 else 1e6) if m > -3 else None
 gauss(0.75, 0.5, 0.5, 1 + 1e-9, 3e7)  # the limit form beside the integer
 gauss(0.75, 0.5, 0.5, 1 + 1e-8, 3e8)  # the connection next to its poles
+gauss(0.75, 0.5, 0.5, 1 + 3.5e-8, 6e7)
 
 # Series that end: by a or b, with c a lower negative integer, after Euler's transformation.
 for x in (-1.0, -0.6, 0.3, 0.9, 0.999):
@@ -53,24 +54,27 @@ for x in (-1.0, -0.6, 0.3, 0.9, 0.999):
     gauss(x, 0.3, 6.25, 2.25, 40)
     gauss(x, 2.5, 1.25, 2.5, 8)
     gauss(x, 1.25, 40, 1.25, 40)
+gauss(0.3, 900.25, 2.5, 2.5, 20)  # a power that multiplies the rounding of 1 - x
 gauss(1.0, -5, 2.2, 0.3, 40)
-for a, b, c in [(0.7, 1.3, 2.25), (0.5, 0.5, 3), (-0.6, 2.2, 1.9), (-20.5, 33.25, 60.5), (130.5, 140.25, 400.0)]:
+for a, b, c in [(0.7, 1.3, 2.25), (0.5, 0.5, 3), (-0.6, 2.2, 1.9), (-20.5, 33.25, 60.5), (130.5, 140.25, 400.0),
+                (71.25, -90.5, 2.75), (2.75, 0.25, 60.5)]:
     gauss(1.0, a, b, c, 4000 if c > 300 else 400)
 
 # The Bessel functions: small and large arguments, orders that are integers or not, negative orders.
 for x, a, b in [(1.5, -1.3, 2.2), (-3, 2.3, 1.1), (-3, 2.3, -1.1), (20, -30, 5.5), (-8, 3.25, 6), (12, -4, 2),
-                (-25, 7.5, 3), (1e-3, -0.5, 0.5), (40, -25.5, 2), (-0.01, 50, 1.5), (9, -60.25, 12.5)]:
+                (-25, 7.5, 3), (1e-3, -0.5, 0.5), (40, -25.5, 2), (-0.01, 50, 1.5), (9, -60.25, 12.5), (60, -100.5, 2.25)]:
     kummer(x, a, b, 2e4)
 # Series of one sign, with cancellation, with terms that rise again behind the poles.
 for x, a, b in [(0.5, 0.7, 1.3), (10, 2.5, 0.25), (60, 3, 7), (300, 1.5, 2.5), (-2, -3.5, 1.25), (5, 1.5, -20.5),
-                (1e-200, 3, 2)]:
+                (1e-200, 3, 2), (13, 1.3, -60.5)]:
     kummer(x, a, b, 200)
 for x, a, b in [(-9, 1.5, 3), (-20, 0.5, 4.25), (-30, 2.25, 7.5), (-25, -0.5, 1), (-35, 1, 9), (-40, -7.5, 0.3)]:
     kummer(x, a, b, 60)
 kummer(50.0, -3 - 2.0**-50, 2, 2e5)  # a term almost vanishes, those behind it lead
 # The asymptotic form, on both sides.
 for x, a, b in [(-90, 0.5, 4.25), (-300, 1.5, 4), (-1e5, 2.25, 9.5), (-1e5, -1.5, 2), (-400, -3.25, 0.5),
-                (-1e300, 0.5, 2.25), (690, 4.25, 1.5), (680, -17.25, 17.5)]:
+                (-1e300, 0.5, 2.25), (690, 4.25, 1.5), (680, -17.25, 17.5),
+                (-237.25, 2, 0.5)]:
     kummer(x, a, b, 2000)
 # Sums that end.
 for x, a, b in [(3, -2, -5), (-50, -6, 0.5), (7.5, -1, 4), (-2, -4, -7)]:
