@@ -119,6 +119,9 @@ class Refusing(unittest.TestCase):
         "const exactly": "\n/** A. */ QX_API void f(QX_IN DBL *x);",
         "const exactly if": "\n/** A. */ QX_API void f(QX_OUT const DBL *x);",
         "must be the last": "\n/** A. */ QX_API void f(QX_OUT ErrorCode *err, int32_t n);",
+        "out-parameter must be QX_OUT": "\n/** A. */ QX_API void f(QX_INOUT ErrorCode *err);",
+        "word must be QX_INOUT":
+            "\ntypedef void *PlanSlot; /** A. */ QX_API void f(QX_IN PlanSlot *slot);",
         "unknown type long": "\n/** A. */ QX_API void f(long n);",
         "unknown result type": "\n/** A. */ QX_API long f(int32_t n);",
         "a type and a name": "\n/** A. */ QX_API void f(int32_t);",
