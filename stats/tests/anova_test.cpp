@@ -151,6 +151,15 @@ TEST(Contingency, FaultsAndEmptyRows) {
     };
     EXPECT_EQ(code(1, 3, {1, 2, 3}), ErrTableTooSmall);
     EXPECT_EQ(code(0, 0, {}), ErrTableTooSmall);
+    const qx::test::Array2D<ElementType::I32> negative(0, 0);
+    for (const int32_t rows : {-1, 0}) {
+        (*negative.handle())->dimSizes[0] = rows;
+        (*negative.handle())->dimSizes[1] = -1 - rows;
+        Contingency c = {7, 7, 7};
+        EXPECT_EQ(Contingency_head(negative.handle(), &c.chiSquare, &c.p, &c.err), 0);
+        EXPECT_EQ(c.err, ErrTableNegativeSize);
+    }
+    (*negative.handle())->dimSizes[0] = (*negative.handle())->dimSizes[1] = 0;
     EXPECT_EQ(code(2, 2, {1, 2, -3, 4}), ErrTableNegativeSize);
     const Contingency emptyRow = ContingencyOf(2, 2, {0, 0, 3, 4});
     EXPECT_EQ(emptyRow.err, 0);

@@ -93,6 +93,20 @@ TEST(Distributions, InversesLieWithinTheirToleranceBelow) {
     EXPECT_NE(NormalQuantile(0.5).value, 0.0);
 }
 
+// The answers of a bisection stand on a grid that its bracket and its tolerance set.
+TEST(Distributions, InversesKeepTheirBrackets) {
+    const auto expectOnGrid = [](double value, double lo, double hi, int halvings) {
+        const double steps = (value - lo) / (hi - lo) * std::exp2(halvings);
+        EXPECT_NEAR(steps, std::round(steps), 1e-6) << value;
+    };
+    for (const double p : {0.01, 0.3, 0.77}) {
+        expectOnGrid(Call(InvTdist_head, p, 4).value, -10000.0, 10000.0, 28);
+        expectOnGrid(Call(InvFDist_head, p, 4, 7).value, 1e-06, 10000.0, 27);
+        expectOnGrid(Call(InvChiSquare_head, p, 4).value, 0.0, 5000.0, 26);
+        expectOnGrid(Call(InvChiSquare_head, p, 7000).value, 0.0, 10000.0, 27);
+    }
+}
+
 TEST(Distributions, EdgesAndCodes) {
     for (const int32_t dof : {1, 2, 1000000})
         EXPECT_EQ(Call(TDist_head, 0.0, dof).value, 0.5);
