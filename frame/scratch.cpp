@@ -149,8 +149,8 @@ ErrorCode ScratchRealloc(void **block, int32_t size) {
     void *moved;
     if (const ErrorCode status = ScratchAlloc(&moved, size))
         return status;
-    std::memcpy(moved, *block,
-                static_cast<std::size_t>(std::min<int32_t>(old.totalSize, total) - frontSize));
+    const int32_t oldTotal = old.totalSize; // a copy, since references forget the alignment
+    std::memcpy(moved, *block, static_cast<std::size_t>(std::min(oldTotal, total) - frontSize));
     GiveBackTo(old.mode, front);
     *block = moved;
     return 0;
