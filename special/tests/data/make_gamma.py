@@ -12,13 +12,10 @@ for x in [1e-300, 1e-9, 0.3, 1.4616321449683623, 1.5, 5.5, 37.25, 1e5, 1e12, 1e3
 for x in (-0.5, -0.504083008264455409, -1e-9, -1e-300, -3.7, -9.999, -10.25, -33.125, -1000.75, -1e6 - 0.5):
     row("Psi", [x], 0, mpmath.digamma(mpf(x)), 12, abs(mpmath.pi * mpmath.cot(mpmath.pi * mpf(x))) + 1)
 
-for a in (1e-300, 1e-9, 0.5, 1.0, 2.5, 10.0, 33.5, 100.0, 171.0, 1e4, 1e9):
-    for b in (1e-9, 0.75, 1.0, 3.0, 40.0, 165.5, 1234.5, 1e9):
+for a in (1e-300, 1e-9, 0.5, 1.0, 2.5, 10.0, 18.566433578077874, 25.3, 33.5, 100.0, 171.0, 1e4, 1e9):
+    for b in (1e-9, 0.75, 1.0, 2.6251833548202748, 3.0, 7.1, 40.0, 165.5, 1234.5, 1e9):
         value = mpmath.beta(mpf(a), mpf(b))
-        # A product of three gammas for moderate arguments; beyond, logarithms of the size that
-        # the exponents have.
-        size = sum(abs(mpmath.loggamma(mpf(v))) for v in (a, b, a + b))
-        row("BetaComplete", [a, b], 0, value, 40 + (2 * size if a + b > 100 else 0))
+        row("BetaComplete", [a, b], 0, value, 12)
 for a, b in [(-2.5, 1.25), (-4.8178181157026057, -19.159449570182726), (-0.3, -0.7 + 2.0**-40), (3.2563498815717686, -17.5)]:
     # beside the poles of gamma(a + b) the rounding of the sum would count a thousandfold
     row("BetaComplete", [a, b], 0, mpmath.beta(mpf(a), mpf(b)), 16)
