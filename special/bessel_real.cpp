@@ -18,7 +18,6 @@ constexpr double kNaN = std::numeric_limits<double>::quiet_NaN();
 constexpr double kEps = 2.220446049250313e-16;
 constexpr double kLowestOrder = -200;
 constexpr double kLargeOrder = 200;
-constexpr double kInt32 = 2147483647;
 constexpr double kTwoOverPi = 0.6366197723675814;
 constexpr int kMostTerms = 1000;
 
