@@ -178,18 +178,21 @@ void MirrorSums(DBL *values, ptrdiff_t stride, ptrdiff_t n) {
 
 ErrorCode ExecuteComplex(const FFTPlan &plan, const DBL *inRe, const DBL *inIm, DBL *outRe,
                          DBL *outIm, ptrdiff_t inStride, ptrdiff_t outStride) {
+    const bool interleaved = inIm == inRe + 1 && outIm == outRe + 1 && outStride == 2;
+    if (plan.whole != nullptr) {
+        if (interleaved && inStride == 2)
+            plan.whole->complexSideBySide(inRe, outRe);
+        else
+            plan.whole->complexLeaf(inRe, inIm, outRe, outIm, inStride, outStride, 1);
+        return 0;
+    }
     if (plan.factorCount == 0) {
         outRe[0] = inRe[0];
         outIm[0] = inIm[0];
         return 0;
     }
-    const bool interleaved = inIm == inRe + 1 && outIm == outRe + 1 && outStride == 2;
-    if (plan.factorCount == 1) {
-        if (!interleaved || inStride != 2 || !LeafHasKernels(plan))
-            return RunComplexLeaf(plan, inRe, inIm, outRe, outIm, inStride, outStride, 1);
-        plan.stages[0]->kernels->complexSideBySide(inRe, outRe);
-        return 0;
-    }
+    if (plan.factorCount == 1)
+        return RunComplexLeaf(plan, inRe, inIm, outRe, outIm, inStride, outStride, 1);
     if (interleaved && LeafHasKernels(plan))
         return RecurseLanes<ComplexLanesPath>(plan, 0, plan.length, inRe, outRe, inStride,
                                               {1, 0, 0});
@@ -198,16 +201,19 @@ ErrorCode ExecuteComplex(const FFTPlan &plan, const DBL *inRe, const DBL *inIm, 
 
 ErrorCode ExecuteReal(const FFTPlan &plan, const DBL *in, DBL *out, ptrdiff_t inStride,
                       ptrdiff_t outStride) {
+    if (plan.whole != nullptr) {
+        if (inStride == 1 && outStride == 1)
+            plan.whole->realSideBySide(in, out);
+        else
+            plan.whole->realLeaf(in, out, inStride, outStride, 1);
+        return 0;
+    }
     if (plan.factorCount == 0) {
         out[0] = in[0];
         return 0;
     }
-    if (plan.factorCount == 1) {
-        if (inStride != 1 || outStride != 1 || !LeafHasKernels(plan))
-            return RunRealLeaf(plan, in, out, inStride, outStride, 1);
-        plan.stages[0]->kernels->realSideBySide(in, out);
-        return 0;
-    }
+    if (plan.factorCount == 1)
+        return RunRealLeaf(plan, in, out, inStride, outStride, 1);
     if (outStride == 1 && LeafHasKernels(plan))
         return RecurseLanes<RealLanesPath>(plan, 0, plan.length, in, out, inStride, {1, 0, 0});
     return RecurseReal(plan, 0, plan.length, in, out, inStride, outStride);

@@ -11,31 +11,26 @@ void SetElement(DBL *buffer, std::ptrdiff_t i, double re, double im) {
 }
 
 void ExpandPlain(DBL *buffer, std::ptrdiff_t n) {
-    for (std::ptrdiff_t k = 1; k <= (n - 1) / 2; ++k) {
-        const double re = buffer[2 * k];
-        const double im = buffer[2 * (n - k)];
-        SetElement(buffer, k, re, im);
-        SetElement(buffer, n - k, re, -im);
-    }
-    buffer[1] = 0;
+    const DBL *const h = buffer + n;
+    const double nyquist = h[n / 2];
+    // Element k ends at 2k + 1, which reaches into h only where h[0] stood.
+    SetElement(buffer, 0, h[0], 0);
+    for (std::ptrdiff_t k = 1; k <= (n - 1) / 2; ++k)
+        SetElement(buffer, k, h[k], h[n - k]);
+    for (std::ptrdiff_t k = 1; k <= (n - 1) / 2; ++k)
+        SetElement(buffer, n - k, buffer[2 * k], -buffer[2 * k + 1]);
     if (n % 2 == 0)
-        buffer[n + 1] = 0;
+        SetElement(buffer, n / 2, nyquist, 0);
 }
 
 void ExpandShifted(DBL *buffer, std::ptrdiff_t n) {
+    const DBL *const h = buffer;
     const std::ptrdiff_t middle = n / 2;
-    const double zeroFrequency = buffer[0];
-    const double nyquist = buffer[2 * middle];
-    // Frequencies k and m swap places: element middle + k held the imaginary part of m, and
-    // element middle + m that of k.
-    for (std::ptrdiff_t k = 1, m = n - middle - 1; k <= m; ++k, --m) {
-        const double reK = buffer[2 * k];
-        const double imK = buffer[2 * (n - k)];
-        const double reM = buffer[2 * m];
-        const double imM = buffer[2 * (n - m)];
-        SetElement(buffer, middle + k, reK, imK);
-        SetElement(buffer, middle + m, reM, imM);
-    }
+    const double zeroFrequency = h[0];
+    const double nyquist = h[middle];
+    // The elements above the middle one stand behind h, which is overwritten after them.
+    for (std::ptrdiff_t k = 1; k <= (n - 1) / 2; ++k)
+        SetElement(buffer, middle + k, h[k], h[n - k]);
     for (std::ptrdiff_t k = 1; k <= (n - 1) / 2; ++k)
         SetElement(buffer, middle - k, buffer[2 * (middle + k)], -buffer[2 * (middle + k) + 1]);
     if (n % 2 == 0)
@@ -46,22 +41,19 @@ void ExpandShifted(DBL *buffer, std::ptrdiff_t n) {
 } // namespace
 
 void FFTHalfToFull(DBL *buffer, int32_t n, int32_t shift) {
-    const auto expand = shift == 0 ? ExpandPlain : ExpandShifted;
-    expand(buffer, n);
+    const std::ptrdiff_t length = n;
+    if (shift == 0)
+        for (std::ptrdiff_t i = length - 1; i >= 0; --i)
+            buffer[length + i] = buffer[2 * i];
+    else
+        for (std::ptrdiff_t i = 0; i < length; ++i)
+            buffer[i] = buffer[2 * i];
+    FFTCompactToFull(buffer, n, shift);
 }
 
-void FFTCompactToFull(DBL *buffer, int32_t n) {
-    const std::ptrdiff_t length = n;
-    const DBL *const h = buffer + length;
-    const double nyquist = h[length / 2];
-    // Element k ends at 2k + 1, which reaches into h only where h[0] stood.
-    SetElement(buffer, 0, h[0], 0);
-    for (std::ptrdiff_t k = 1; k <= (length - 1) / 2; ++k)
-        SetElement(buffer, k, h[k], h[length - k]);
-    for (std::ptrdiff_t k = 1; k <= (length - 1) / 2; ++k)
-        SetElement(buffer, length - k, buffer[2 * k], -buffer[2 * k + 1]);
-    if (n % 2 == 0)
-        SetElement(buffer, length / 2, nyquist, 0);
+void FFTCompactToFull(DBL *buffer, int32_t n, int32_t shift) {
+    const auto expand = shift == 0 ? ExpandPlain : ExpandShifted;
+    expand(buffer, n);
 }
 
 void FFTFullToHalf(const DBL *in, int32_t n, int32_t shift, DBL *h) {

@@ -13,9 +13,13 @@ namespace qx {
 // Expands in place a buffer of n complex values that holds h[i] in the real slot of element i.
 void FFTHalfToFull(DBL *buffer, int32_t n, int32_t shift);
 
-// The same in plain order for a buffer that holds h in its last n values, where a transform of
-// stride 1, which is the faster one, has put it.
-void FFTCompactToFull(DBL *buffer, int32_t n);
+// The same for a buffer in which h stands in one piece, as transforms of stride 1, which are the
+// faster ones, give it: its place is at the end of the buffer in plain order, at the start in
+// shifted order.
+inline DBL *CompactHalf(DBL *buffer, int32_t n, int32_t shift) {
+    return shift == 0 ? buffer + n : buffer;
+}
+void FFTCompactToFull(DBL *buffer, int32_t n, int32_t shift);
 
 // Reads only the non-negative frequencies, and of zero and n/2 only the real part.
 void FFTFullToHalf(const DBL *in, int32_t n, int32_t shift, DBL *h);

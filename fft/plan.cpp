@@ -1,7 +1,9 @@
 #include "fft/plan.h"
 
 #include "fft/execute.h"
+#include "fft/factorise.h"
 #include "fft/kernels/kernels.h"
+#include "frame/elements.h"
 #include "frame/platform.h"
 
 #include <cmath>
@@ -9,7 +11,6 @@
 #include <cstdlib>
 #include <limits>
 #include <mutex>
-#include <utility>
 
 namespace qx {
 namespace {
@@ -35,33 +36,6 @@ bool Allocate(T *&table, int64_t count) {
         return false;
     table = static_cast<T *>(std::malloc(static_cast<std::size_t>(count) * sizeof(T)));
     return table != nullptr;
-}
-
-void Append(FFTPlan *plan, int32_t factor, int32_t kind) {
-    plan->factors[plan->factorCount] = factor;
-    plan->kinds[plan->factorCount] = kind;
-    ++plan->factorCount;
-}
-
-void Factorise(FFTPlan *plan) {
-    int32_t n = plan->length;
-    for (const int32_t radix : kernelRadices)
-        for (; n % radix == 0; n /= radix)
-            Append(plan, radix, KernelFactor);
-    for (int32_t d = 3; int64_t{d} * d <= n; d += 2)
-        for (; n % d == 0; n /= d)
-            Append(plan, d, d < 50 ? DirectPrime : RaderPrime);
-    if (n > 1)
-        Append(plan, n, n <= 49 ? DirectPrime : RaderPrime);
-    // The smallest factor becomes stage 0, the largest the leaf.
-    for (int32_t i = 0; i < plan->factorCount; ++i) {
-        for (int32_t j = i + 1; j < plan->factorCount; ++j) {
-            if (plan->factors[j] < plan->factors[i]) {
-                std::swap(plan->factors[i], plan->factors[j]);
-                std::swap(plan->kinds[i], plan->kinds[j]);
-            }
-        }
-    }
 }
 
 // The powers of exp(-i theta) from the first up: each from the one before by a recurrence whose
@@ -160,38 +134,43 @@ void BuildRaderOrders(FFTStage *stage, int32_t p) {
     }
 }
 
-// The spectrum of the roots in the order of the powers of the generator; temporary holds
-// 2 (p - 1) values.
-bool BuildRaderSpectrum(FFTStage *stage, int32_t p, DBL *temporary) {
-    const int32_t n = p - 1;
+// The spectrum of the roots in the order of the powers of the generator. A padded convolution of
+// n values begins with those p - 1 and ends with the last p - 2 of them, so that every sum over
+// the orders wraps around as it does without padding.
+bool BuildRaderSpectrum(FFTStage *stage, int32_t p, int32_t n) {
+    DBL *temporary = nullptr;
+    if (!Allocate(temporary, 2 * int64_t{n}))
+        return false;
+    Fill(temporary, 2 * ptrdiff_t{n}, 0.0);
     Roots roots(twoPi / p);
-    for (int32_t t = 0; t < n; ++t) {
+    for (int32_t t = 0; t < p - 1; ++t) {
         stage->raderCos[t] = roots.re;
         stage->raderSin[t] = roots.im;
         roots.advance();
     }
     const double scale = 1.0 / n;
-    for (int32_t i = 0; i < n; ++i) {
+    for (int32_t i = 0; i < p - 1; ++i) {
         const int32_t root = stage->raderScatter[i + 1] - 1;
-        temporary[i] = stage->raderCos[root] * scale;
-        temporary[n + i] = stage->raderSin[root] * scale;
+        const ptrdiff_t wrapped = i == 0 ? 0 : n - (p - 1) + i;
+        temporary[i] = temporary[wrapped] = stage->raderCos[root] * scale;
+        temporary[n + i] = temporary[n + wrapped] = stage->raderSin[root] * scale;
     }
-    return ExecuteComplex(*stage->raderPlan, temporary, temporary + n, stage->raderCos,
-                          stage->raderSin, 1, 1) == 0;
+    const ErrorCode status = ExecuteComplex(*stage->raderPlan, temporary, temporary + n,
+                                            stage->raderCos, stage->raderSin, 1, 1);
+    std::free(temporary);
+    return status == 0;
 }
 
 bool BuildRader(FFTStage *stage, int32_t p) {
-    if (!Allocate(stage->raderCos, p - 1) || !Allocate(stage->raderSin, p - 1) ||
+    const int32_t n = RaderLength(p);
+    if (!Allocate(stage->raderCos, n) || !Allocate(stage->raderSin, n) ||
         !Allocate(stage->raderGather, p) || !Allocate(stage->raderScatter, p))
         return false;
-    stage->raderPlan = Acquire(p - 1);
-    DBL *temporary = nullptr;
-    if (stage->raderPlan == nullptr || !Allocate(temporary, 2 * int64_t{p - 1}))
+    stage->raderPlan = Acquire(n);
+    if (stage->raderPlan == nullptr)
         return false;
     BuildRaderOrders(stage, p);
-    const bool built = BuildRaderSpectrum(stage, p, temporary);
-    std::free(temporary);
-    return built;
+    return BuildRaderSpectrum(stage, p, n);
 }
 
 bool BuildStage(FFTStage *stage, int32_t p, int32_t kind, int32_t n) {
@@ -225,7 +204,11 @@ void FillKernels(FFTPlan *plan) {
         plan->realTwiddle[s] = kernels.realTwiddle;
         plan->complexLeaf[s] = kernels.complexLeaf;
         plan->complexTwiddle[s] = kernels.complexTwiddle;
+        if (plan->factorCount == 1)
+            plan->whole = &kernels;
     }
+    if (plan->factorCount > 1)
+        plan->whole = WholeKernelsOf(plan->length);
 }
 
 // Releases a plan, whole or as far as it was built.

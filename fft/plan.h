@@ -41,8 +41,9 @@ struct FFTStage {
     // Every stage but the last, which works on sub-transforms of length n and has m = n / p:
     // exp(-2 pi i j k / n) at index (k - 1)(p - 1) + (j - 1), k from 1 to m - 1, j from 1 to p - 1.
     DBL *twiddleCos, *twiddleSin;
-    // Rader prime: the plan of length p - 1, held by reference, the spectrum of the roots in the
-    // order of the powers of a generator, scaled by 1 / (p - 1), and the two orders of p indices.
+    // Rader prime: the plan of its convolution, held by reference, of length p - 1 or, padded, the
+    // one that RaderLength gives; the spectrum of the roots in the order of the powers of a
+    // generator, scaled by 1 / length, and the two orders of p indices.
     FFTPlan *raderPlan;
     DBL *raderCos, *raderSin;
     int32_t *raderGather, *raderScatter;
@@ -68,6 +69,10 @@ struct FFTPlan {
     qx::ComplexLeaf complexLeaf[maxFactors];
     qx::ComplexTwiddle complexTwiddle[maxFactors];
     FFTPlan *prev, *next; // the cache
+
+    // The kernels that transform this length in one call: those of the only factor, or of a small
+    // length with several, where the stages would cost more than the arithmetic; else null.
+    const qx::KernelSet *whole;
 
     // Twiddles of the cosine transforms, built by QuarterWave at its first call; else null.
     mutable std::atomic<const double *> quarterWave;

@@ -1,6 +1,7 @@
 #include "fft/prime_stages.h"
 
 #include "fft/execute.h"
+#include "frame/elements.h"
 #include "frame/lanes.h"
 #include "frame/scratch.h"
 
@@ -35,7 +36,19 @@ struct Output {
 Output Interleaved(DBL *values) { return {values, values + 1, 2}; }
 
 // The p-point transforms. They gather their input into `work` first, so they may work in place.
-// Each takes 2p values of work, the real Rader transform 4p.
+
+// The values of work that each of them takes. A padded convolution has its spectrum in work too.
+bool IsPadded(const PrimeFactor &factor) {
+    return factor.kind == RaderPrime && factor.stage->raderPlan->length != factor.p - 1;
+}
+int64_t ComplexWork(const PrimeFactor &factor) {
+    return IsPadded(factor) ? 4 * int64_t{factor.stage->raderPlan->length} : 2 * int64_t{factor.p};
+}
+int64_t RealWork(const PrimeFactor &factor) {
+    if (factor.kind == DirectPrime)
+        return factor.p;
+    return IsPadded(factor) ? 4 * int64_t{factor.stage->raderPlan->length} : 4 * int64_t{factor.p};
+}
 
 ErrorCode DirectComplex(const PrimeFactor &factor, Input x, Output y, DBL *work) {
     const ptrdiff_t p = factor.p;
@@ -108,18 +121,22 @@ ErrorCode DirectReal(const PrimeFactor &factor, const DBL *x, ptrdiff_t inStride
     return 0;
 }
 
-// Multiplies value i - 1 of the spectrum by that of the roots and conjugates it: together with the
+// Multiplies value k of the spectrum by that of the roots and conjugates it: together with the
 // conjugation at the end, a forward transform then serves as the inverse one.
-void SetConjugateProduct(const FFTStage &stage, ptrdiff_t i, double a, double b, Output y) {
-    const double c = stage.raderCos[i - 1];
-    const double s = stage.raderSin[i - 1];
-    y.set(i, c * a - s * b, -(a * s) - c * b);
+void SetConjugateProduct(const FFTStage &stage, ptrdiff_t k, double a, double b, Output y) {
+    const double c = stage.raderCos[k];
+    const double s = stage.raderSin[k];
+    y.set(k, c * a - s * b, -(a * s) - c * b);
 }
 
 ErrorCode RaderComplex(const PrimeFactor &factor, Input x, Output y, DBL *work) {
     const FFTStage &stage = *factor.stage;
+    const FFTPlan &plan = *stage.raderPlan;
     const ptrdiff_t p = factor.p;
+    const ptrdiff_t n = plan.length;
     const Output gathered = Interleaved(work);
+    const Output spectrum = IsPadded(factor) ? Interleaved(work + 2 * n)
+                                             : Output{y.re + y.stride, y.im + y.stride, y.stride};
     const double x0Re = x.re[0];
     const double x0Im = x.im[0];
     double sumRe = x0Re;
@@ -130,15 +147,17 @@ ErrorCode RaderComplex(const PrimeFactor &factor, Input x, Output y, DBL *work) 
         sumRe += x.re[source];
         sumIm += x.im[source];
     }
+    Fill(work + 2 * (p - 1), 2 * (n - (p - 1)), 0.0);
     y.set(0, sumRe, sumIm);
-    ErrorCode status = ExecuteComplex(*stage.raderPlan, gathered.re, gathered.im, y.re + y.stride,
-                                      y.im + y.stride, 2, y.stride);
+    ErrorCode status = ExecuteComplex(plan, gathered.re, gathered.im, spectrum.re, spectrum.im, 2,
+                                      spectrum.stride);
     if (status < 0)
         return status;
-    for (ptrdiff_t i = 1; i < p; ++i)
-        SetConjugateProduct(stage, i, y.re[i * y.stride], y.im[i * y.stride], y);
-    status = ExecuteComplex(*stage.raderPlan, y.re + y.stride, y.im + y.stride, gathered.re,
-                            gathered.im, y.stride, 2);
+    for (ptrdiff_t k = 0; k < n; ++k)
+        SetConjugateProduct(stage, k, spectrum.re[k * spectrum.stride],
+                            spectrum.im[k * spectrum.stride], spectrum);
+    status = ExecuteComplex(plan, spectrum.re, spectrum.im, gathered.re, gathered.im,
+                            spectrum.stride, 2);
     if (status < 0)
         return status;
     for (ptrdiff_t i = 1; i < p; ++i)
@@ -146,13 +165,15 @@ ErrorCode RaderComplex(const PrimeFactor &factor, Input x, Output y, DBL *work) 
     return 0;
 }
 
+// The length of a convolution is even, padded or not.
 ErrorCode RaderReal(const PrimeFactor &factor, const DBL *x, ptrdiff_t inStride, DBL *y,
                     ptrdiff_t outStride, DBL *work) {
     const FFTStage &stage = *factor.stage;
+    const FFTPlan &plan = *stage.raderPlan;
     const ptrdiff_t p = factor.p;
-    const ptrdiff_t n = p - 1;
+    const ptrdiff_t n = plan.length;
     DBL *const half = work; // n values, half-complex
-    const Output spectrum = Interleaved(work + 2 * p);
+    const Output spectrum = Interleaved(work + 2 * n);
     DBL *const gathered = spectrum.re; // n values, before the spectrum
     const double x0 = x[0];
     double sum = x0;
@@ -160,18 +181,17 @@ ErrorCode RaderReal(const PrimeFactor &factor, const DBL *x, ptrdiff_t inStride,
         gathered[i - 1] = x[stage.raderGather[i] * inStride];
         sum += gathered[i - 1];
     }
-    ErrorCode status = ExecuteReal(*stage.raderPlan, gathered, half, 1, 1);
+    Fill(gathered + (p - 1), n - (p - 1), 0.0);
+    ErrorCode status = ExecuteReal(plan, gathered, half, 1, 1);
     if (status < 0)
         return status;
-    // The n values of the spectrum go to places 1 to n, as the product counts them.
-    SetConjugateProduct(stage, 1, half[0], 0, spectrum);
+    SetConjugateProduct(stage, 0, half[0], 0, spectrum);
     for (ptrdiff_t k = 1; 2 * k < n; ++k) {
-        SetConjugateProduct(stage, k + 1, half[k], half[n - k], spectrum);
-        SetConjugateProduct(stage, n - k + 1, half[k], -half[n - k], spectrum);
+        SetConjugateProduct(stage, k, half[k], half[n - k], spectrum);
+        SetConjugateProduct(stage, n - k, half[k], -half[n - k], spectrum);
     }
-    SetConjugateProduct(stage, n / 2 + 1, half[n / 2], 0, spectrum);
-    status =
-        ExecuteComplex(*stage.raderPlan, spectrum.re + 2, spectrum.im + 2, work, work + 1, 2, 2);
+    SetConjugateProduct(stage, n / 2, half[n / 2], 0, spectrum);
+    status = ExecuteComplex(plan, spectrum.re, spectrum.im, work, work + 1, 2, 2);
     if (status < 0)
         return status;
     y[0] = sum;
@@ -256,7 +276,7 @@ ErrorCode PrimeComplexLeaf(const PrimeFactor &factor, const DBL *inRe, const DBL
                            DBL *outIm, ptrdiff_t inStride, ptrdiff_t outStride, int32_t count) {
     const ptrdiff_t p = factor.p;
     Scratch<ElementType::DBL> work;
-    ErrorCode status = work.allocate(2 * int64_t{p});
+    ErrorCode status = work.allocate(ComplexWork(factor));
     for (ptrdiff_t i = 0; i < count && status == 0; ++i) {
         const Input x = {inRe + i * inStride, inIm + i * inStride, count * inStride};
         const Output y = {outRe + i * p * outStride, outIm + i * p * outStride, outStride};
@@ -269,7 +289,7 @@ ErrorCode PrimeRealLeaf(const PrimeFactor &factor, const DBL *in, DBL *out, ptrd
                         ptrdiff_t outStride, int32_t count) {
     const ptrdiff_t p = factor.p;
     Scratch<ElementType::DBL> work;
-    ErrorCode status = work.allocate(int64_t{p} * (factor.kind == DirectPrime ? 1 : 4));
+    ErrorCode status = work.allocate(RealWork(factor));
     for (ptrdiff_t i = 0; i < count && status == 0; ++i)
         status = TransformReal(factor, in + i * inStride, count * inStride, out + i * p * outStride,
                                outStride, work.data());
@@ -280,7 +300,7 @@ ErrorCode PrimeComplexTwiddle(const PrimeFactor &factor, DBL *re, DBL *im, ptrdi
                               int32_t m) {
     const ptrdiff_t p = factor.p;
     Scratch<ElementType::DBL> work;
-    ErrorCode status = work.allocate(4 * int64_t{p});
+    ErrorCode status = work.allocate(2 * int64_t{p} + ComplexWork(factor));
     if (status < 0)
         return status;
     const Output column = Interleaved(work.data());
@@ -300,7 +320,7 @@ ErrorCode PrimeComplexTwiddle(const PrimeFactor &factor, DBL *re, DBL *im, ptrdi
 
 ErrorCode PrimeRealTwiddle(const PrimeFactor &factor, DBL *data, ptrdiff_t stride, int32_t m) {
     Scratch<ElementType::DBL> work;
-    ErrorCode status = work.allocate(4 * int64_t{factor.p});
+    ErrorCode status = work.allocate(2 * int64_t{factor.p} + ComplexWork(factor));
     if (status == 0)
         status = TransformReal(factor, data, m * stride, data, m * stride, work.data());
     for (ptrdiff_t k = 1; k <= (m - 1) / 2 && status == 0; ++k)

@@ -12,7 +12,7 @@ namespace {
 
 constexpr double Pi = 3.141592653589793;
 
-double *BuildQuarterWave(int32_t length) {
+double *QuarterWaveOf(int32_t length) {
     const int64_t entries = int64_t{length} / 2 + 1;
     if (entries > std::numeric_limits<std::ptrdiff_t>::max() / int64_t{2 * sizeof(double)})
         return nullptr;
@@ -30,11 +30,9 @@ double *BuildQuarterWave(int32_t length) {
 
 } // namespace
 
-const DBL *QuarterWave(const FFTPlan *plan) {
-    const double *wave = plan->quarterWave.load(std::memory_order_acquire);
-    if (wave)
-        return wave;
-    double *const built = BuildQuarterWave(plan->length);
+const DBL *BuildQuarterWave(const FFTPlan *plan) {
+    double *const built = QuarterWaveOf(plan->length);
+    const double *wave = nullptr;
     // Of several threads that build one at the same time, the first one's stays.
     if (plan->quarterWave.compare_exchange_strong(wave, built, std::memory_order_acq_rel))
         return built;

@@ -19,7 +19,10 @@ public:
     typedef typename Element<Code>::type T;
 
     HeapBlock() = default;
-    ~HeapBlock() { std::free(block_); }
+    ~HeapBlock() {
+        if (block_)
+            std::free(block_);
+    }
     HeapBlock(const HeapBlock &) = delete;
     HeapBlock &operator=(const HeapBlock &) = delete;
 

@@ -63,16 +63,10 @@ int32_t RealForward(RealIn in, ComplexOut out, Keep keep, int32_t offset, int32_
     if (const ErrorCode failed = window.take(in.data(), in.size(), offset, size))
         return failed;
     DBL *const spectrum = &out.data()->re;
-    ErrorCode status;
-    if (shift == 0) {
-        status = FFTRealForward(keep.plan(), window.data(), spectrum + size, 1, 1, size);
-        if (status == 0)
-            FFTCompactToFull(spectrum, size);
-    } else {
-        status = FFTRealForward(keep.plan(), window.data(), spectrum, 1, 2, size);
-        if (status == 0)
-            FFTHalfToFull(spectrum, size, shift);
-    }
+    const ErrorCode status =
+        FFTRealForward(keep.plan(), window.data(), CompactHalf(spectrum, size, shift), 1, 1, size);
+    if (status == 0)
+        FFTCompactToFull(spectrum, size, shift);
     return Merge(status, window.release());
 }
 

@@ -1,5 +1,6 @@
 #!/usr/bin/python3
-"""Writes the straight-line transforms of the radices: one file kernels_<p>.cpp per radix.
+"""Writes the straight-line transforms of the radices: one file kernels_<p>.cpp per radix, and one
+for each of a few small lengths that are transformed whole.
 
     generate.py FOLDER
 
@@ -12,6 +13,8 @@ Each file holds four texts over a lane type V:
     OddTransform<p>       for even p: p real values to the complex values at the half-odd
                           frequencies, X[q] = sum over j of x[j] exp(-2 pi i j (q + 1/2) / p),
                           2q + 1 < p
+
+The files of the whole lengths have the first and the third.
 
 All do the same arithmetic on the parts of each value, so packed and split data give the same bits.
 
@@ -36,8 +39,10 @@ from pathlib import Path
 getcontext().prec = 60
 
 RADICES = [2, 3, 4, 5, 7, 8, 9, 10, 11, 13, 14, 16, 17, 18, 19, 29, 31, 32, 37, 41, 43]
+# Lengths of two factors that are transformed whole.
+WHOLE = [6, 12]
 # Composite length -> its factor r; coprime factors are recognised.
-SPLIT = {4: 2, 6: 2, 8: 2, 9: 3, 10: 2, 14: 2, 16: 4, 18: 2, 32: 4}
+SPLIT = {4: 2, 6: 2, 8: 2, 9: 3, 10: 2, 12: 3, 14: 2, 16: 4, 18: 2, 32: 4}
 
 
 # ---- Exact constants -----------------------------------------------------------------------
@@ -402,20 +407,23 @@ def odd_text(p):
 
 
 def file_of(p):
-    texts = [packed_text(p), split_text(p), real_text(p)] + ([odd_text(p)] if p % 2 == 0 else [])
+    texts = [packed_text(p), real_text(p)]
+    if p in RADICES:
+        texts += [split_text(p)] + ([odd_text(p)] if p % 2 == 0 else [])
+    maker = "MakeKernels" if p in RADICES else "MakeWholeKernels"
     return "\n".join([
-        f"// The kernels of radix {p}, made by fft/kernels/generate.py.\n",
+        f"// The kernels of {p}, made by fft/kernels/generate.py.\n",
         "#include \"fft/kernels/kernel_set.h\"\n\nnamespace qx {\n",
         *texts,
         f"template <>\nconst KernelSet &KernelsFor<{p}>() {{",
-        f"    static constexpr KernelSet kernels = MakeKernels<{p}>();\n    return kernels;\n}}\n",
+        f"    static constexpr KernelSet kernels = {maker}<{p}>();\n    return kernels;\n}}\n",
         "} // namespace qx\n"])
 
 
 def main():
     folder = Path(sys.argv[1])
     folder.mkdir(parents=True, exist_ok=True)
-    for p in RADICES:
+    for p in RADICES + WHOLE:
         (folder / f"kernels_{p}.cpp").write_text(file_of(p))
 
 

@@ -409,6 +409,14 @@ constexpr KernelSet MakeKernels() {
             RealSideBySide<P>};
 }
 
+// Of a length that is transformed whole: there are no stages of it.
+template <int P>
+constexpr KernelSet MakeWholeKernels() {
+    return {RealLeafKernel<P>,    nullptr,          ComplexLeafKernel<P>, nullptr,
+            RealLanesLeaf<P>,     nullptr,          ComplexLanesLeaf<P>,  nullptr,
+            ComplexSideBySide<P>, RealSideBySide<P>};
+}
+
 } // namespace qx
 
 #endif

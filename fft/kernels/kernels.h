@@ -46,6 +46,9 @@ struct KernelSet {
 const KernelSet &KernelsOf(int32_t radix);
 template <int P>
 const KernelSet &KernelsFor();
+// Those of a length that is transformed whole although it has several factors, 6 or 12, else null.
+// They have no twiddle kernels.
+const KernelSet *WholeKernelsOf(int32_t length);
 
 // The lane tables hold the twiddles of a stage with factor p in the order in which the kernels read
 // them: block after block of columns, as many as fill the lanes, and in a block entry by entry of

@@ -1,6 +1,7 @@
 #include "fft/plan_slot.h"
 #include "qx/errors.h"
 #include "qx/fft.h"
+#include "qx/frame.h"
 #include "tests/support/heap_probe.h"
 #include "tests/support/hostile_host.h"
 #include "tests/support/transform_reference.h"
@@ -8,6 +9,7 @@
 #include <gtest/gtest.h>
 
 #include <cmath>
+#include <functional>
 #include <limits>
 
 namespace {
@@ -331,6 +333,63 @@ TEST(OneDimensional, EveryFailedAllocationEndsCleanly) {
             }
             EXPECT_GT(failAt, 4);
         }
+}
+
+// What a node does call after call, in real time too: with its plan held and the workspace serving,
+// no export turns to the heap, whatever its length, window and order.
+TEST(OneDimensional, AHeldPlanNeedsNoHeap) {
+    if (!HeapProbe::works())
+        GTEST_SKIP();
+    WorkspaceStatus workspace = {0, 0};
+    InitializeAnalysisWorkspaceH(1U << 20, &workspace);
+    for (const int32_t n : {1, 12, 60, 46, 53, 106, 167, 512})
+        for (const int32_t shift : {0, 1}) {
+            SCOPED_TRACE(testing::Message() << n << " " << shift);
+            const DBLArray real(RandomSignal(n)), half(RandomSignal(n));
+            const CDBArray complex(RandomComplex(n));
+            CDBArray complexOut;
+            DBLArray realOut;
+            Node node;
+            const auto calls = {
+                std::function([&] {
+                    return ReOXFFTH80(real.handle(), complexOut.handle(), &node.slot, 0, n, shift);
+                }),
+                std::function([&] { // padded
+                    return ReOXFFTH80(real.handle(), complexOut.handle(), &node.slot, n / 2, n,
+                                      shift);
+                }),
+                std::function([&] {
+                    return CxOXFFTH80(complex.handle(), complexOut.handle(), &node.slot, n / 2, n,
+                                      shift);
+                }),
+                std::function(
+                    [&] { return ReOXFFTHCH(real.handle(), realOut.handle(), &node.slot); }),
+                std::function([&] {
+                    return InvReOXFFTH80(complex.handle(), realOut.handle(), &node.slot, shift);
+                }),
+                std::function([&] {
+                    return InvCxOXFFTH80(complex.handle(), complexOut.handle(), &node.slot, shift);
+                }),
+                std::function(
+                    [&] { return InvReOXFFTHCH(half.handle(), realOut.handle(), &node.slot); }),
+                std::function([&] {
+                    return ReOXFFTH80_IDP(real.handle(), complexOut.handle(), &node.instance, 0, n,
+                                          shift);
+                }),
+            };
+            int32_t index = 0;
+            for (const std::function<ErrorCode()> &call : calls) {
+                ASSERT_EQ(call(), 0);
+                EnableAnalysisWorkspaceH(&workspace);
+                const HeapProbe probe;
+                EXPECT_EQ(call(), 0) << index;
+                EXPECT_EQ(probe.allocations(), 0) << index;
+                DisableAnalysisWorkspaceH(&workspace);
+                ++index;
+            }
+        }
+    UninitializeAnalysisWorkspaceH(&workspace);
+    EXPECT_EQ(workspace.code, 0);
 }
 
 TEST(OneDimensional, RequestsBeyondMemoryEndInACode) {

@@ -87,6 +87,24 @@ TEST(Plan, PrimePlansHoldTheirSubPlans) {
     }
 }
 
+// Where p - 1 has large prime factors in turn, the convolution is padded: long enough that nothing
+// wraps around wrongly, and done by kernels.
+TEST(Plan, PrimesWithoutSmallFactorsBelowAreConvolvedWithPadding) {
+    for (const int32_t p : {167, 719, 10007, 24469}) {
+        const PlanReference plan(p);
+        ASSERT_TRUE(plan);
+        EXPECT_EQ(FactorsOf(*plan.get()), (Factors{{p, 2}}));
+        const FFTPlan &convolution = *plan.get()->stages[0]->raderPlan;
+        EXPECT_GE(convolution.length, 2 * p - 3);
+        for (const auto &[factor, kind] : FactorsOf(convolution))
+            EXPECT_EQ(kind, 0) << factor;
+    }
+    for (const int32_t p : {53, 107, 257, 8191}) {
+        const PlanReference plan(p);
+        EXPECT_EQ(plan.get()->stages[0]->raderPlan->length, p - 1);
+    }
+}
+
 TEST(Plan, HoldsTheRootsAtTheirPlaces) {
     const PlanReference plan(4 * 13 * 23); // factors 4, 13, 23
     const FFTPlan &table = *plan.get();
