@@ -7,20 +7,23 @@
 #include "spectra/power_spectrum.h"
 
 #include <cstdint>
+#include <cstring>
 
 namespace {
 
 using namespace qx::bench;
 
+// The spectrum works in place, so each call gets the signal anew, at the same cost on both sides;
+// the time of the copy is taken off again. (A call on the result of the one before would read
+// what the processor is still storing.)
 void Compare(int32_t n, Ratios &ratios) {
+    const HostMemory signal(n);
     const HostMemory in(n);
     const HostMemory out(n);
     const qx::PlanReference plan(n);
-    // The spectrum works in place, so the values shrink from call to call; they are set anew
-    // often enough to keep clear of denormal numbers, at the same cost on both sides.
     const auto refill = [&] {
-        for (int32_t i = 0; i < n; i += 64)
-            in.data()[i] = 1.0;
+        std::memcpy(in.data(), signal.data(), sizeof(double) * n);
+        Keep(in);
     };
     const auto times = MedianTimes(
         [&] {
@@ -30,10 +33,12 @@ void Compare(int32_t n, Ratios &ratios) {
         [&] {
             refill();
             qx::FFTRealForward(plan.get(), in.data(), out.data(), 1, 1, n);
-        });
-    ratios.add(times[0] / times[1]);
-    std::printf("%8d power spectrum %10.3f us, over the bare transform %5.2f\n", n, times[0] * 1e6,
-                times[0] / times[1]);
+        },
+        refill);
+    const double ratio = (times[0] - times[2]) / (times[1] - times[2]);
+    ratios.add(ratio);
+    std::printf("%8d power spectrum %10.3f us, over the bare transform %5.2f\n", n,
+                (times[0] - times[2]) * 1e6, ratio);
     std::fflush(stdout);
 }
 

@@ -1,5 +1,7 @@
 // The cosine transform of even lengths against FFTW's REDFT10, and its inverse against REDFT01;
 // one thread, plans made outside the timed loop.
+//
+// bench_transforms [LENGTH...]
 
 #include "bench/host_memory.h"
 #include "bench/timing.h"
@@ -7,6 +9,8 @@
 #include "transforms/dct.h"
 
 #include <cstdint>
+#include <cstdlib>
+#include <vector>
 
 #ifdef QX_PEER_FFTW3
 #include <fftw3.h>
@@ -78,11 +82,17 @@ void Compare(int32_t n, [[maybe_unused]] Totals &totals) {
 
 } // namespace
 
-int main() {
+int main(int argc, char **argv) {
     Totals totals;
+    std::vector<int32_t> lengths = {8,     16,    32,    50,     64,     100,     128,
+                                    256,   360,   512,   1000,   1024,   2048,    4096,
+                                    10000, 16384, 65536, 100000, 262144, 1000000, 1048576};
+    if (argc > 1)
+        lengths.clear();
+    for (int i = 1; i < argc; ++i)
+        lengths.push_back(std::atoi(argv[i]));
     std::printf("time of ours; ratios to FFTW with FFTW_ESTIMATE and FFTW_MEASURE\n");
-    for (int32_t n : {8,    16,   32,   50,    64,    100,   128,    256,    360,     512,    1000,
-                      1024, 2048, 4096, 10000, 16384, 65536, 100000, 262144, 1000000, 1048576})
+    for (const int32_t n : lengths)
         Compare(n, totals);
     totals.forwardEstimate.print();
     totals.forwardMeasure.print();
