@@ -21,8 +21,7 @@ template <class Distribution>
 double Bisect(double p, double lo, double hi, Distribution distribution) {
     do {
         const double mid = (lo + hi) * 0.5;
-        const bool isBelow = p > distribution(mid); // false for NaN
-        (isBelow ? lo : hi) = mid;
+        (p <= distribution(mid) ? hi : lo) = mid;
     } while (std::fabs(hi - lo) > 0.0001);
     return lo;
 }
