@@ -1,5 +1,5 @@
 #!/usr/bin/python3
-"""Writes data/reference.txt: arguments that are hard for a mathematics library, and random ones,
+"""Writes data/reference.dat: arguments that are hard for a mathematics library, and random ones,
 with the values computed by mpmath to 80 digits. Each line holds the function, its arguments and
 the value as a sum of two doubles, all in hexadecimal."""
 import math
@@ -107,7 +107,7 @@ def main():
             low = float(value - mp.mpf(high))
             lines.append(" ".join([name] + [x.hex() for x in row] + [high.hex(), low.hex()]))
     (HERE / "data").mkdir(exist_ok=True)
-    (HERE / "data/reference.txt").write_text("\n".join(lines) + "\n")
+    (HERE / "data/reference.dat").write_text("\n".join(lines) + "\n")
 
 
 if __name__ == "__main__":

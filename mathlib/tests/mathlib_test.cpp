@@ -39,7 +39,7 @@ double ErrorInUlps(double value, double high, double low) {
 }
 
 TEST(MathLibrary, ErrorStaysBelowOneUlpOnHardAndRandomArguments) {
-    std::ifstream file(QX_TEST_DATA "reference.txt");
+    std::ifstream file(QX_TEST_DATA "reference.dat");
     ASSERT_TRUE(file.is_open());
     std::map<std::string, double> worst;
     int cases = 0;

@@ -43,7 +43,7 @@ double Value(const char *name, double a, double b = 0, int output = 0) {
 }
 
 TEST(SpecialBessel, AgreesWithReferencesOnBothSidesOfEachThreshold) {
-    EXPECT_GT(qx::test::ExpectAgreement(Exports(), QX_TEST_DATA "bessel.txt"), 1000);
+    EXPECT_GT(qx::test::ExpectAgreement(Exports(), QX_TEST_DATA "bessel.dat"), 1000);
 }
 
 TEST(SpecialBessel, KeepsTheRulesOfDomainsAndLimits) {

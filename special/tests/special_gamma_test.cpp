@@ -35,7 +35,7 @@ double Value(const char *name, double a, double b = 0, double c = 0) {
 }
 
 TEST(SpecialGamma, AgreesWithReferencesOnBothSidesOfEachThreshold) {
-    EXPECT_GT(qx::test::ExpectAgreement(Exports(), QX_TEST_DATA "gamma.txt"), 200);
+    EXPECT_GT(qx::test::ExpectAgreement(Exports(), QX_TEST_DATA "gamma.dat"), 200);
 }
 
 TEST(SpecialGamma, KeepsTheRulesOfDomainsAndLimits) {

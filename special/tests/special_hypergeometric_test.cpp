@@ -30,7 +30,7 @@ double Value(const char *name, double x, double a, double b, double c = 0) {
 }
 
 TEST(SpecialHypergeometric, AgreesWithReferencesInEachForm) {
-    EXPECT_GT(qx::test::ExpectAgreement(Exports(), QX_TEST_DATA "hypergeometric.txt"), 400);
+    EXPECT_GT(qx::test::ExpectAgreement(Exports(), QX_TEST_DATA "hypergeometric.dat"), 400);
 }
 
 TEST(SpecialHypergeometric, KeepsTheRulesOfDomainsAndLimits) {

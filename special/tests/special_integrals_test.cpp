@@ -33,7 +33,7 @@ double Value(const char *name, double a, double b = 0) {
 }
 
 TEST(SpecialIntegrals, AgreesWithReferencesOnBothSidesOfEachThreshold) {
-    EXPECT_GT(qx::test::ExpectAgreement(Exports(), QX_TEST_DATA "integrals.txt"), 380);
+    EXPECT_GT(qx::test::ExpectAgreement(Exports(), QX_TEST_DATA "integrals.dat"), 380);
 }
 
 TEST(SpecialIntegrals, KeepsTheRulesOfDomainsAndLimits) {

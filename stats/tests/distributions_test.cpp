@@ -47,7 +47,7 @@ void ExpectCode(const Outcome &outcome, ErrorCode code) {
 }
 
 TEST(Distributions, AgreeWithMultiplePrecision) {
-    const auto rows = qx::test::ReadTable(QX_STATS_DATA "/distributions.txt");
+    const auto rows = qx::test::ReadTable(QX_STATS_DATA "/distributions.dat");
     ASSERT_GT(rows.size(), 200U);
     for (const auto &row : rows) {
         const auto &a = row.arguments;

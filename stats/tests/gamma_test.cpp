@@ -53,7 +53,7 @@ TEST(GammaFamily, AgreesWithMultiplePrecision) {
               return 6e-15 * (20 + a[0] + a[1]) * std::max(std::fabs(v), 0.1);
           }}},
     };
-    const auto rows = qx::test::ReadTable(QX_STATS_DATA "/gamma.txt");
+    const auto rows = qx::test::ReadTable(QX_STATS_DATA "/gamma.dat");
     ASSERT_GT(rows.size(), 700U);
     for (const auto &row : rows) {
         const Function &function = functions.at(row.name);

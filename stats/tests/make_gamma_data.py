@@ -1,5 +1,5 @@
 #!/usr/bin/python3
-"""Writes data/gamma.txt and data/distributions.txt: the gamma family and the distribution functions
+"""Writes data/gamma.dat and data/distributions.dat: the gamma family and the distribution functions
 at 40 digits (mpmath), rounded to double. A line: NAME ARGUMENT ... VALUE, numbers as hex floats."""
 
 import random
@@ -57,5 +57,5 @@ def distribution_lines():
 
 if __name__ == "__main__":
     data = Path(__file__).parent / "data"
-    (data / "gamma.txt").write_text("\n".join(gamma_lines()) + "\n")
-    (data / "distributions.txt").write_text("\n".join(distribution_lines()) + "\n")
+    (data / "gamma.dat").write_text("\n".join(gamma_lines()) + "\n")
+    (data / "distributions.dat").write_text("\n".join(distribution_lines()) + "\n")

@@ -174,7 +174,7 @@ TEST(DCTDST, TwoDimensionsByDefinitionCroppedAndPadded) {
 }
 
 TEST(DCTDST, AgreeWithSciPy) {
-    std::ifstream file(QX_TRANSFORM_DATA "/dct_dst.txt");
+    std::ifstream file(QX_TRANSFORM_DATA "/dct_dst.dat");
     std::string line;
     int lines = 0;
     for (; std::getline(file, line); ++lines) {

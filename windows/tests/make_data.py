@@ -1,5 +1,5 @@
 #!/usr/bin/python3
-"""Writes data/windows.txt: windows from their formulas at 40 digits (mpmath), Dolph-Chebyshev from
+"""Writes data/windows.dat: windows from their formulas at 40 digits (mpmath), Dolph-Chebyshev from
 the product form of the Chebyshev polynomial's inverse transform, each value rounded to double.
 
 A line: NAME FORM PARAM n w[0] ... w[n-1].  FORM is periodic or symmetric."""
@@ -93,4 +93,4 @@ def lines():
 
 
 if __name__ == "__main__":
-    (Path(__file__).parent / "data" / "windows.txt").write_text("\n".join(lines()) + "\n")
+    (Path(__file__).parent / "data" / "windows.dat").write_text("\n".join(lines()) + "\n")

@@ -4,7 +4,7 @@
 The tolerance is absolute: so many eps of the value or, where the function oscillates, of its
 modulus. Points stand on both sides of each threshold of a method.
 
-usage: make_bessel.py > bessel.txt
+usage: make_bessel.py > bessel.dat
 """
 
 import mpmath

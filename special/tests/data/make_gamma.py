@@ -1,5 +1,5 @@
 #!/usr/bin/python3
-"""Values by mpmath at 40 digits for special_gamma_test. usage: make_gamma.py > gamma.txt"""
+"""Values by mpmath at 40 digits for special_gamma_test. usage: make_gamma.py > gamma.dat"""
 
 import mpmath
 from mpmath import mpf

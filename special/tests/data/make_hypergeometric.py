@@ -1,7 +1,7 @@
 #!/usr/bin/python3
 """Values by mpmath at 40 digits for special_hypergeometric_test.
 
-usage: make_hypergeometric.py > hypergeometric.txt
+usage: make_hypergeometric.py > hypergeometric.dat
 """
 
 import mpmath

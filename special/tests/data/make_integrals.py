@@ -1,5 +1,5 @@
 #!/usr/bin/python3
-"""Values by mpmath at 40 digits for special_integrals_test. usage: make_integrals.py > integrals.txt"""
+"""Values by mpmath at 40 digits for special_integrals_test. usage: make_integrals.py > integrals.dat"""
 
 import mpmath
 from mpmath import mpf

@@ -1,5 +1,5 @@
 #!/usr/bin/python3
-"""Writes dct_dst.txt: SciPy's cosine (type II, orthonormal) and sine (type I) transforms.
+"""Writes dct_dst.dat: SciPy's cosine (type II, orthonormal) and sine (type I) transforms.
 
 Each line: kind (dct, dst, dct2, dst2), rows, cols, then rows*cols inputs and as many results.
 SciPy's type I sine transform carries a factor 2 for each dimension, taken out here.
@@ -25,5 +25,5 @@ for shape in ((3, 4), (4, 3), (5, 2)):
     x = rng.uniform(-1, 1, shape)
     write("dct2", x, scipy.fft.dctn(x, type=2, norm="ortho"))
     write("dst2", x, scipy.fft.dstn(x, type=1) / 4)
-with open("dct_dst.txt", "w") as file:
+with open("dct_dst.dat", "w") as file:
     file.write("\n".join(lines) + "\n")
