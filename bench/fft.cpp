@@ -2,6 +2,7 @@
 //
 // bench_fft [GROUP...]: small, powers, tens, products, primes, cold, plan; all by default.
 
+#include "bench/fftw_plan.h"
 #include "bench/timing.h"
 #include "fft/plan.h"
 
@@ -9,54 +10,36 @@
 #include <cstring>
 #include <memory>
 
-#ifdef QX_PEER_FFTW3
-#include <fftw3.h>
-#endif
-
 namespace {
 
 using namespace qx::bench;
 using qx::PlanReference;
 
 #ifdef QX_PEER_FFTW3
-// A peer's plan over memory of its own, aligned as the peer likes it.
+// FFTW over as many blocks of data as ours.
 class Peer {
 public:
     Peer(int32_t n, bool real, unsigned effort, std::size_t copies)
-        : n_(n), real_(real), copies_(copies), distance_(2 * std::size_t(n) + 8),
-          in_(fftw_alloc_real(distance_ * copies)), out_(fftw_alloc_real(distance_ * copies)) {
-        plan_ = real ? fftw_plan_dft_r2c_1d(n, in_, Complex(out_), effort)
-                     : fftw_plan_dft_1d(n, Complex(in_), Complex(out_), FFTW_FORWARD, effort);
-        for (std::size_t i = 0; i < distance_ * copies; ++i)
-            in_[i] = static_cast<double>(i * 7919 % 1024) / 512 - 1;
-    }
-    ~Peer() {
-        fftw_destroy_plan(plan_);
-        fftw_free(in_);
-        fftw_free(out_);
-    }
-    Peer(const Peer &) = delete;
-    Peer &operator=(const Peer &) = delete;
+        : real_(real), copies_(copies), distance_(2 * std::size_t(n) + 8),
+          plan_(distance_ * copies, [=](double *in, double *out) {
+              fftw_complex *const to = FFTWPlan::Complex(out);
+              return real ? fftw_plan_dft_r2c_1d(n, in, to, effort)
+                          : fftw_plan_dft_1d(n, FFTWPlan::Complex(in), to, FFTW_FORWARD, effort);
+          }) {}
 
     void operator()() const {
         const std::size_t at = next_ * distance_;
         if (real_)
-            fftw_execute_dft_r2c(plan_, in_ + at, Complex(out_ + at));
+            plan_.realAt(at);
         else
-            fftw_execute_dft(plan_, Complex(in_ + at), Complex(out_ + at));
+            plan_.complexAt(at);
         next_ = next_ + 1 == copies_ ? 0 : next_ + 1;
     }
 
 private:
-    static fftw_complex *Complex(double *values) {
-        return reinterpret_cast<fftw_complex *>(values);
-    }
-
-    int32_t n_;
     bool real_;
     std::size_t copies_, distance_;
-    double *in_, *out_;
-    fftw_plan plan_;
+    FFTWPlan plan_;
     mutable std::size_t next_ = 0;
 };
 #endif

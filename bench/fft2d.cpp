@@ -1,5 +1,6 @@
 // Two-dimensional transforms against FFTW, one thread, plans made outside the timed loop.
 
+#include "bench/fftw_plan.h"
 #include "bench/host_memory.h"
 #include "bench/timing.h"
 #include "fft/plan.h"
@@ -7,39 +8,19 @@
 
 #include <cstdint>
 
-#ifdef QX_PEER_FFTW3
-#include <fftw3.h>
-#endif
-
 namespace {
 
 using namespace qx::bench;
 
 #ifdef QX_PEER_FFTW3
-class Peer {
-public:
-    Peer(int32_t rows, int32_t cols, bool real, unsigned effort)
-        : in_(fftw_alloc_complex(std::size_t(rows) * cols)),
-          out_(fftw_alloc_complex(std::size_t(rows) * cols)) {
-        double *const values = reinterpret_cast<double *>(in_);
-        plan_ = real ? fftw_plan_dft_r2c_2d(rows, cols, values, out_, effort)
-                     : fftw_plan_dft_2d(rows, cols, in_, out_, FFTW_FORWARD, effort);
-        for (std::size_t i = 0; i < 2 * std::size_t(rows) * cols; ++i)
-            values[i] = static_cast<double>(i * 7919 % 1024) / 512 - 1;
-    }
-    ~Peer() {
-        fftw_destroy_plan(plan_);
-        fftw_free(in_);
-        fftw_free(out_);
-    }
-    Peer(const Peer &) = delete;
-    Peer &operator=(const Peer &) = delete;
-    void operator()() const { fftw_execute(plan_); }
-
-private:
-    fftw_complex *in_, *out_;
-    fftw_plan plan_;
-};
+FFTWPlan Peer(int32_t rows, int32_t cols, bool real, unsigned effort) {
+    return {2 * std::size_t(rows) * cols, [=](double *in, double *out) {
+                fftw_complex *const to = FFTWPlan::Complex(out);
+                return real ? fftw_plan_dft_r2c_2d(rows, cols, in, to, effort)
+                            : fftw_plan_dft_2d(rows, cols, FFTWPlan::Complex(in), to, FFTW_FORWARD,
+                                               effort);
+            }};
+}
 #endif
 
 struct Totals {
@@ -52,8 +33,8 @@ void Compare(int32_t rows, int32_t cols, bool real, const Ours &ours,
              [[maybe_unused]] Totals &totals) {
     std::printf("%5d x %5d %-8s", rows, cols, real ? "real" : "complex");
 #ifdef QX_PEER_FFTW3
-    const Peer estimate(rows, cols, real, FFTW_ESTIMATE);
-    const Peer measure(rows, cols, real, FFTW_MEASURE);
+    const FFTWPlan estimate = Peer(rows, cols, real, FFTW_ESTIMATE);
+    const FFTWPlan measure = Peer(rows, cols, real, FFTW_MEASURE);
     const auto times = MedianTimes(ours, estimate, measure);
     totals.estimate.add(times[0] / times[1]);
     totals.measure.add(times[0] / times[2]);

@@ -3,6 +3,7 @@
 //
 // bench_transforms [LENGTH...]
 
+#include "bench/fftw_plan.h"
 #include "bench/host_memory.h"
 #include "bench/timing.h"
 #include "fft/plan.h"
@@ -12,36 +13,15 @@
 #include <cstdlib>
 #include <vector>
 
-#ifdef QX_PEER_FFTW3
-#include <fftw3.h>
-#endif
-
 namespace {
 
 using namespace qx::bench;
 
 #ifdef QX_PEER_FFTW3
-class Peer {
-public:
-    Peer(int32_t n, fftw_r2r_kind kind, unsigned effort)
-        : in_(fftw_alloc_real(n)), out_(fftw_alloc_real(n)),
-          plan_(fftw_plan_r2r_1d(n, in_, out_, kind, effort)) {
-        for (int32_t i = 0; i < n; ++i)
-            in_[i] = static_cast<double>(i * 7919 % 1024) / 512 - 1;
-    }
-    ~Peer() {
-        fftw_destroy_plan(plan_);
-        fftw_free(in_);
-        fftw_free(out_);
-    }
-    Peer(const Peer &) = delete;
-    Peer &operator=(const Peer &) = delete;
-    void operator()() const { fftw_execute(plan_); }
-
-private:
-    double *in_, *out_;
-    fftw_plan plan_;
-};
+FFTWPlan Peer(int32_t n, fftw_r2r_kind kind, unsigned effort) {
+    return {std::size_t(n),
+            [=](double *in, double *out) { return fftw_plan_r2r_1d(n, in, out, kind, effort); }};
+}
 #endif
 
 struct Totals {
@@ -62,9 +42,9 @@ void Compare(int32_t n, [[maybe_unused]] Totals &totals) {
         qx::DCTInverse(in.data(), out.data(), 1, 1, n, work.data(), plan.get());
     };
 #ifdef QX_PEER_FFTW3
-    const Peer estimate(n, FFTW_REDFT10, FFTW_ESTIMATE);
-    const Peer measure(n, FFTW_REDFT10, FFTW_MEASURE);
-    const Peer inverseMeasure(n, FFTW_REDFT01, FFTW_MEASURE);
+    const FFTWPlan estimate = Peer(n, FFTW_REDFT10, FFTW_ESTIMATE);
+    const FFTWPlan measure = Peer(n, FFTW_REDFT10, FFTW_MEASURE);
+    const FFTWPlan inverseMeasure = Peer(n, FFTW_REDFT01, FFTW_MEASURE);
     const auto times = MedianTimes(forward, estimate, measure);
     const auto inverseTimes = MedianTimes(inverse, inverseMeasure);
     totals.forwardEstimate.add(times[0] / times[1]);

@@ -19,12 +19,12 @@ constexpr int kMostRounds = 40;                      // of Landen's transformati
 bool IsParameter(double m) { return m >= 0 && m <= 1; }
 
 // F and E of 0 < phi < pi / 2, 0 < m < 1, in the scaled form of the transformation.
-struct Incomplete {
+struct LandenSums {
     double first; // F
     double extra; // E = F E(m) / K(m) + extra
 };
 
-Incomplete Landen(double phi, double m) {
+LandenSums Landen(double phi, double m) {
     double a = 1;
     double b = std::sqrt(1 - m);
     double c = std::sqrt(m);
@@ -84,48 +84,46 @@ double EllipticE(double m) {
     return table::ellipticENear(m1) - std::log(m1) * (m1 * table::ellipticELog(m1));
 }
 
-double EllipticF(double phi, double m) {
+namespace {
+
+// An incomplete integral by its complete form and by its values for 0 < phi < pi / 2 at m = 1 and
+// elsewhere.
+template <class AtOne, class General>
+double Incomplete(double phi, double m, double (*complete)(double), AtOne atOne, General general) {
     if (!IsParameter(m) || std::isnan(phi))
         return kNaN;
     if (std::isinf(phi))
         return phi;
     const Amplitude split = Split(phi);
     if (split.halfTurns != 0)
-        return 2 * split.halfTurns * EllipticK(m) + EllipticF(split.rest, m);
+        return 2 * split.halfTurns * complete(m) +
+               Incomplete(split.rest, m, complete, atOne, general);
     if (phi == 0 || m == 0)
         return phi;
     const double size = std::fabs(phi);
     double value;
     if (IsQuarter(size))
-        value = EllipticK(m);
-    else if (m == 1)
-        value = std::log(std::tan(0.25 * kPi + 0.5 * size));
+        value = complete(m);
     else
-        value = Landen(size, m).first;
+        value = m == 1 ? atOne(size) : general(size);
     return phi < 0 ? -value : value;
 }
 
+} // namespace
+
+double EllipticF(double phi, double m) {
+    return Incomplete(
+        phi, m, EllipticK, [](double size) { return std::log(std::tan(0.25 * kPi + 0.5 * size)); },
+        [m](double size) { return Landen(size, m).first; });
+}
+
 double EllipticE(double phi, double m) {
-    if (!IsParameter(m) || std::isnan(phi))
-        return kNaN;
-    if (std::isinf(phi))
-        return phi;
-    const Amplitude split = Split(phi);
-    if (split.halfTurns != 0)
-        return 2 * split.halfTurns * EllipticE(m) + EllipticE(split.rest, m);
-    if (phi == 0 || m == 0)
-        return phi;
-    const double size = std::fabs(phi);
-    double value;
-    if (IsQuarter(size)) {
-        value = EllipticE(m);
-    } else if (m == 1) {
-        value = std::sin(size);
-    } else {
-        const Incomplete parts = Landen(size, m);
-        value = parts.first * (EllipticE(m) / EllipticK(m)) + parts.extra;
-    }
-    return phi < 0 ? -value : value;
+    return Incomplete(
+        phi, m, EllipticE, [](double size) { return std::sin(size); },
+        [m](double size) {
+            const LandenSums parts = Landen(size, m);
+            return parts.first * (EllipticE(m) / EllipticK(m)) + parts.extra;
+        });
 }
 
 namespace {

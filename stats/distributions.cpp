@@ -15,6 +15,14 @@ constexpr double infinity = std::numeric_limits<double>::infinity();
 // A NaN is not refused.
 bool IsNoProbability(double p) { return p < 0.0 || p > 1.0; }
 
+// A probability of 0 or 1 has its quantile at once: the lower end of the range, or +infinity.
+bool IsCertain(double p, double lowerEnd, DBL *quantile) {
+    if (p != 0.0 && p != 1.0)
+        return false;
+    *quantile = p == 0.0 ? lowerEnd : infinity;
+    return true;
+}
+
 // The point where the distribution reaches p, from below, within 1e-4.
 // kept: the tolerance is absolute for every scale of the answer
 template <class Distribution>
@@ -71,10 +79,8 @@ ErrorCode ChiSquareCDF(double x, int32_t dof, DBL *p) {
 ErrorCode NormalQuantile(double p, DBL *x) {
     if (IsNoProbability(p))
         return ErrProbabilityOutOfRange;
-    if (p == 0.0 || p == 1.0) {
-        *x = p == 0.0 ? -infinity : infinity;
+    if (IsCertain(p, -infinity, x))
         return 0;
-    }
     const auto ratio = [](double u) {
         return ((0.010328 * u + 0.802853) * u + 2.515517) /
                (((0.001308 * u + 0.189269) * u + 1.432788) * u + 1.0);
@@ -94,10 +100,8 @@ ErrorCode StudentQuantile(double p, int32_t dof, DBL *t) {
         return ErrTooFewForParameters;
     if (IsNoProbability(p))
         return ErrProbabilityOutOfRange;
-    if (p == 0.0 || p == 1.0) {
-        *t = p == 0.0 ? -infinity : infinity;
+    if (IsCertain(p, -infinity, t))
         return 0;
-    }
     *t = Bisect(p, -10000.0, 10000.0, [dof](double mid) {
         double value = 0.0;
         StudentCDF(mid, dof, &value);
@@ -111,10 +115,8 @@ ErrorCode FisherQuantile(double p, int32_t n, int32_t d, DBL *f) {
         return ErrTooFewForParameters;
     if (IsNoProbability(p))
         return ErrProbabilityOutOfRange;
-    if (p == 0.0 || p == 1.0) {
-        *f = p == 0.0 ? 0.0 : infinity;
+    if (IsCertain(p, 0.0, f))
         return 0;
-    }
     *f = Bisect(p, 1e-06, 10000.0, [n, d](double mid) {
         double value = 0.0;
         FisherCDF(mid, n, d, &value);
@@ -129,10 +131,8 @@ ErrorCode ChiSquareQuantile(double p, int32_t dof, DBL *x) {
         return ErrProbabilityOutOfRange;
     if (dof < 1)
         return ErrTooFewForParameters;
-    if (p == 0.0 || p == 1.0) {
-        *x = p == 0.0 ? 0.0 : infinity;
+    if (IsCertain(p, 0.0, x))
         return 0;
-    }
     const auto distribution = [dof](double mid) {
         double value = 0.0;
         ChiSquareCDF(mid, dof, &value);

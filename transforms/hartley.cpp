@@ -4,21 +4,37 @@
 #include "frame/heap_block.h"
 
 #include <cstddef>
+#include <optional>
 
 namespace qx {
+namespace {
+
+// The half-complex spectrum of n values in a block from the heap, with the plan that made it.
+struct HalfSpectrum {
+    HeapBlock<ElementType::DBL> h;
+    std::optional<PlanReference> plan;
+
+    ErrorCode take(const DBL *x, int32_t n) {
+        if (const ErrorCode failed = h.allocate(n))
+            return failed;
+        plan.emplace(n);
+        if (!*plan)
+            return ErrOutOfMemory;
+        return FFTRealForward(plan->get(), x, h.data(), 1, 1, n);
+    }
+};
+
+} // namespace
+
 ErrorCode FastHartley(DBL *x, int32_t n) {
     if (n < 1)
         return ErrEmptyInput;
     if (n == 1)
         return 0;
-    HeapBlock<ElementType::DBL> h;
-    if (const ErrorCode failed = h.allocate(n))
+    HalfSpectrum spectrum;
+    if (const ErrorCode failed = spectrum.take(x, n))
         return failed;
-    const PlanReference plan(n);
-    if (!plan)
-        return ErrOutOfMemory;
-    if (const ErrorCode failed = FFTRealForward(plan.get(), x, h.data(), 1, 1, n))
-        return failed;
+    DBL *const h = spectrum.h.data();
     x[0] = h[0];
     for (std::ptrdiff_t k = 1; k <= (n - 1) / 2; ++k) {
         const double re = h[k];
@@ -47,14 +63,10 @@ ErrorCode FastHilbert(DBL *x, int32_t n) {
         x[0] = 0;
         return 0;
     }
-    HeapBlock<ElementType::DBL> h;
-    if (const ErrorCode failed = h.allocate(n))
+    HalfSpectrum spectrum;
+    if (const ErrorCode failed = spectrum.take(x, n))
         return failed;
-    const PlanReference plan(n);
-    if (!plan)
-        return ErrOutOfMemory;
-    if (const ErrorCode failed = FFTRealForward(plan.get(), x, h.data(), 1, 1, n))
-        return failed;
+    DBL *const h = spectrum.h.data();
     h[0] = 0;
     if (n % 2 == 0)
         h[n / 2] = 0;
@@ -63,7 +75,7 @@ ErrorCode FastHilbert(DBL *x, int32_t n) {
         h[k] = h[n - k];
         h[n - k] = -re;
     }
-    return FFTRealInverse(plan.get(), h.data(), x, 1, 1, n);
+    return FFTRealInverse(spectrum.plan->get(), h, x, 1, 1, n);
 }
 
 ErrorCode FastHilbertInverse(DBL *x, int32_t n) {

@@ -1,5 +1,6 @@
 #include "qx/special_bessel.h"
 #include "tests/recipes/families.h"
+#include "tests/recipes/scalar.h"
 
 #include <limits>
 
@@ -8,19 +9,6 @@ namespace qx::test {
 namespace {
 
 constexpr double kNaN = std::numeric_limits<double>::quiet_NaN();
-
-// One argument, a few values of it; outputs are numbered onward.
-Recipe Single(const char *name, void (*function)(double, double *)) {
-    return {name,
-            [function](Call &c) {
-                const double arguments[] = {0.01 * c.n, 0.5 * c.n, 3.3 * c.n, -0.7 * c.n, kNaN};
-                int output = 0;
-                for (const double x : arguments)
-                    function(x, c.scalar(output++));
-                return 0;
-            },
-            NoStatus};
-}
 
 // Two real arguments.
 Recipe Double(const char *name, void (*function)(double, double, double *)) {
@@ -109,7 +97,7 @@ std::vector<Recipe> SpecialBesselRecipes() {
              return 0;
          },
          NoStatus},
-        Single("QX_Dawson", QX_Dawson),
+        OfNumber("QX_Dawson", QX_Dawson),
         {"QX_FresnelIntegrals",
          [](Call &c) {
              QX_FresnelIntegrals(0.3 * c.n, c.scalar(0), c.scalar(1));
@@ -117,7 +105,7 @@ std::vector<Recipe> SpecialBesselRecipes() {
              return 0;
          },
          NoStatus},
-        Single("QX_Zeta", QX_Zeta),
+        OfNumber("QX_Zeta", QX_Zeta),
     };
 }
 

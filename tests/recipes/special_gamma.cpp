@@ -1,5 +1,6 @@
 #include "qx/special_gamma.h"
 #include "tests/recipes/families.h"
+#include "tests/recipes/scalar.h"
 
 #include <limits>
 
@@ -8,17 +9,6 @@ namespace qx::test {
 namespace {
 
 constexpr double kNaN = std::numeric_limits<double>::quiet_NaN();
-
-Recipe Single(const char *name, void (*function)(double, double *)) {
-    return {name,
-            [function](Call &c) {
-                int output = 0;
-                for (const double x : {0.01 * c.n, 0.5 * c.n, 3.3 * c.n, -0.7 * c.n, kNaN})
-                    function(x, c.scalar(output++));
-                return 0;
-            },
-            NoStatus};
-}
 
 Recipe Pair(const char *name, void (*function)(double, double, double *)) {
     return {name,
@@ -72,9 +62,9 @@ std::vector<Recipe> SpecialGammaRecipes() {
          },
          NoStatus},
         Pair("QX_GammaC", QX_GammaC),
-        Single("QX_LnGamma", QX_LnGamma),
-        Single("QX_Stirling", QX_Stirling),
-        Single("QX_Psi", QX_Psi),
+        OfNumber("QX_LnGamma", QX_LnGamma),
+        OfNumber("QX_Stirling", QX_Stirling),
+        OfNumber("QX_Psi", QX_Psi),
     };
 }
 

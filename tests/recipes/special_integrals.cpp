@@ -1,33 +1,13 @@
 #include "qx/special_integrals.h"
 #include "tests/recipes/families.h"
-
-#include <limits>
+#include "tests/recipes/scalar.h"
 
 namespace qx::test {
 
-namespace {
-
-constexpr double kNaN = std::numeric_limits<double>::quiet_NaN();
-
-// Arguments that reach each of the methods as the size grows.
-Recipe Single(const char *name, void (*function)(double, double *)) {
-    return {
-        name,
-        [function](Call &c) {
-            int output = 0;
-            for (const double x : {0.01 * c.n, 0.3 * c.n, 1.7 * c.n, 3.3 * c.n, -0.7 * c.n, kNaN})
-                function(x, c.scalar(output++));
-            return 0;
-        },
-        NoStatus};
-}
-
-} // namespace
-
 std::vector<Recipe> SpecialIntegralRecipes() {
     return {
-        Single("QX_Erf", QX_Erf),
-        Single("QX_ErfC", QX_ErfC),
+        OfNumber("QX_Erf", QX_Erf),
+        OfNumber("QX_ErfC", QX_ErfC),
         {"QX_ExpI",
          [](Call &c) {
              int output = 0;
@@ -37,11 +17,11 @@ std::vector<Recipe> SpecialIntegralRecipes() {
              return 0;
          },
          NoStatus},
-        Single("QX_SinI", QX_SinI),
-        Single("QX_CosI", QX_CosI),
-        Single("QX_SinhI", QX_SinhI),
-        Single("QX_CoshI", QX_CoshI),
-        Single("QX_Diln", QX_Diln),
+        OfNumber("QX_SinI", QX_SinI),
+        OfNumber("QX_CosI", QX_CosI),
+        OfNumber("QX_SinhI", QX_SinhI),
+        OfNumber("QX_CoshI", QX_CoshI),
+        OfNumber("QX_Diln", QX_Diln),
     };
 }
 

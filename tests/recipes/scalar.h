@@ -1,0 +1,25 @@
+#ifndef QX_TESTS_RECIPES_SCALAR_H
+#define QX_TESTS_RECIPES_SCALAR_H
+
+#include "tests/support/recipe.h"
+
+#include <limits>
+
+namespace qx::test {
+
+// A function of one number, for arguments that reach each of its methods as the size grows.
+inline Recipe OfNumber(const char *name, void (*function)(double, double *)) {
+    return {name,
+            [function](Call &c) {
+                int output = 0;
+                for (const double x : {0.01 * c.n, 0.3 * c.n, 0.5 * c.n, 1.7 * c.n, 3.3 * c.n,
+                                       -0.7 * c.n, std::numeric_limits<double>::quiet_NaN()})
+                    function(x, c.scalar(output++));
+                return 0;
+            },
+            NoStatus};
+}
+
+} // namespace qx::test
+
+#endif
