@@ -84,6 +84,11 @@ for m in [0, 1e-10, 0.3, 0.9, 0.999, 1 - 2.0**-40] + list(sides(0.5)):
         row("Elliptic2", [m, phi], 0, mpmath.ellipe(mpf(phi), mpf(m)), 60)
     row("Elliptic1", [m, mpf("nan")], 0, mpmath.ellipk(mpf(m)), 12)
     row("Elliptic2", [m, mpf("nan")], 0, mpmath.ellipe(mpf(m)), 12)
+for phi in (-1.0, 1e-8, 0.7, 1.5):  # m = 1: a logarithm of what is near 1 for small phi, and a sine
+    row("Elliptic1", [1, phi], 0, mpmath.atanh(mpmath.sin(mpf(phi))), 12, 1)
+    row("Elliptic2", [1, phi], 0, mpmath.sin(mpf(phi)), 12)
+for phi in (3.0, -17.3):
+    row("Elliptic2", [1, phi], 0, mpmath.ellipe(mpf(phi), 1), 60)
 for m in [1e-12, 0.3, 0.99, 1 - 2.0**-33, 1 - 2.0**-27, 1] + list(sides(1e-9, 0.999999999)):
     if m > 1:
         continue
