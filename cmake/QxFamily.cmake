@@ -1,22 +1,48 @@
-# qx_family(NAME stats
-#           CORE basic.cpp ...              inner routines, into qxcore
-#           EXPORTS exports/basic.cpp ...   frames, into the module
-#           TESTS tests/basic_test.cpp ...) one test program <name>_test
+# qx_family(CORE basic.cpp ...                inner routines, into qxcore
+#           LANES convolve_lanes.cpp ...      inner routines written over lanes: once per width
+#           EXPORTS exports/basic.cpp ...     frames, into the module
+#           TESTS tests/basic_test.cpp ...    one test program <family>_test
+#           RECIPES recipes/basic.cpp ...     how the conformance tests call the exports
+#           GENERATED file.cpp ...)           inner routines that the build writes, with full path
+#
+# The family is the folder that says so. A source in the folder that stands in no list fails the
+# configuration, as a listed one that does not exist does; so nothing is skipped without a word.
 function(qx_family)
-    cmake_parse_arguments(F "" "NAME" "CORE;EXPORTS;TESTS" ${ARGN})
+    cmake_parse_arguments(F "" "" "CORE;LANES;EXPORTS;TESTS;RECIPES;GENERATED;UNLISTED" ${ARGN})
+    if(F_UNPARSED_ARGUMENTS)
+        message(FATAL_ERROR "qx_family: ${F_UNPARSED_ARGUMENTS} belongs to no list")
+    endif()
+    cmake_path(GET CMAKE_CURRENT_SOURCE_DIR FILENAME family)
+    file(GLOB_RECURSE found CONFIGURE_DEPENDS RELATIVE ${CMAKE_CURRENT_SOURCE_DIR} *.cpp)
+    foreach(source IN LISTS found)
+        if(NOT source IN_LIST F_CORE AND NOT source IN_LIST F_LANES AND NOT source IN_LIST F_EXPORTS
+            AND NOT source IN_LIST F_TESTS AND NOT source IN_LIST F_RECIPES
+            AND NOT source IN_LIST F_UNLISTED)
+            message(FATAL_ERROR "${CMAKE_CURRENT_SOURCE_DIR}/${source} stands in no list of its family")
+        endif()
+    endforeach()
+
     list(TRANSFORM F_CORE PREPEND ${CMAKE_CURRENT_SOURCE_DIR}/)
+    list(TRANSFORM F_LANES PREPEND ${CMAKE_CURRENT_SOURCE_DIR}/)
     list(TRANSFORM F_EXPORTS PREPEND ${CMAKE_CURRENT_SOURCE_DIR}/)
-    target_sources(qxcore PRIVATE ${F_CORE})
+    list(TRANSFORM F_RECIPES PREPEND ${CMAKE_CURRENT_SOURCE_DIR}/)
+    target_sources(qxcore PRIVATE ${F_CORE} ${F_LANES} ${F_GENERATED})
     target_sources(qxanalysis PRIVATE ${F_EXPORTS})
-    if(QX_TESTS AND F_TESTS)
-        qx_test(${F_NAME}_test ${F_TESTS})
+    if(QX_TESTS)
+        target_sources(qxrecipes PRIVATE ${F_RECIPES})
+        if(F_TESTS)
+            qx_test(${family}_test ${F_TESTS})
+        endif()
     endif()
 endfunction()
 
-# A test program: links the core (inner routines), the module (exports) and the test support.
+# A test program: links the core (inner routines), the module (exports) and the test support, and
+# finds the data of its folder as QX_TEST_DATA "file".
 function(qx_test name)
     add_executable(${name} ${ARGN})
     set_target_properties(${name} PROPERTIES ENABLE_EXPORTS ON)
+    target_compile_definitions(${name} PRIVATE
+        QX_TEST_DATA="${CMAKE_CURRENT_SOURCE_DIR}/tests/data/")
     target_link_libraries(${name} PRIVATE qxanalysis qxcore qxtestsupport GTest::gtest_main)
     qx_run_as_test(${name})
 endfunction()

@@ -198,7 +198,7 @@ TEST(Catalogue, EveryExportHasARecipe) {
         exports.insert(name);
     ASSERT_FALSE(exports.empty()) << QX_EXPORT_LIST;
     for (const std::string &export_ : exports)
-        EXPECT_EQ(known.count(export_), 1U) << export_ << " needs one line in tests/recipes";
+        EXPECT_EQ(known.count(export_), 1U) << export_ << " needs one line in the recipes of its family";
     for (const std::string &recipe : known)
         EXPECT_EQ(exports.count(recipe), 1U) << recipe << " is no export";
 }

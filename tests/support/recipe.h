@@ -186,8 +186,25 @@ struct Recipe {
 
 inline void PrintTo(const Recipe &recipe, std::ostream *stream) { *stream << recipe.name; }
 
-// All recipes, in the order of their families.
+// Exports that are tested by hand, with the reason.
+struct Exempt {
+    const char *name;
+    const char *reason;
+};
+
+// A file hands over what it holds by one object at its end:
+//
+//     const RecipeFile file(SpectraRecipes);
+class RecipeFile {
+public:
+    typedef std::vector<Recipe> (*Make)();
+    explicit RecipeFile(Make make);
+    RecipeFile(std::initializer_list<Exempt> exempt);
+};
+
+// All that the families have handed over, by name.
 const std::vector<Recipe> &AllRecipes();
+const std::vector<Exempt> &ExemptExports();
 
 // One hash per export over all its outputs at all the sizes of its recipes.
 struct ExportHash {
@@ -199,13 +216,6 @@ std::map<std::string, ExportHash> HashEveryExport(const Caller &caller = [](cons
                                                                             Call &call) {
     return recipe.run(call);
 });
-
-// Exports that are tested by hand, with the reason.
-struct Exempt {
-    const char *name;
-    const char *reason;
-};
-const std::vector<Exempt> &ExemptExports();
 
 } // namespace qx::test
 

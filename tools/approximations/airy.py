@@ -1,5 +1,5 @@
 #!/usr/bin/python3
-"""Coefficients of the Airy functions and of Olver's uniform expansion: special/tables/airy.h.
+"""Coefficients of the Airy functions and of Olver's uniform expansion: src/special/tables/airy.h.
 
 usage: airy.py REPOSITORY
 """
@@ -62,4 +62,4 @@ for name, d in (("airy", 0), ("airyp", 1)):
             t.add(f"{name}Wave{which}{label}",
                   f"{which} of the {'function' if d == 0 else 'derivative'}, in 1 / zeta^2",
                   oscillating(which, d), low, high, p, q)
-t.write(sys.argv[1] + "/special/tables/airy.h")
+t.write(sys.argv[1] + "/src/special/tables/airy.h")

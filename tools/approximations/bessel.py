@@ -1,5 +1,5 @@
 #!/usr/bin/python3
-"""Coefficients of the Bessel functions of order 0 and 1: special/tables/bessel.h.
+"""Coefficients of the Bessel functions of order 0 and 1: src/special/tables/bessel.h.
 
 usage: bessel.py REPOSITORY
 """
@@ -86,4 +86,4 @@ for n in (0, 1):
         square = zero[n][k - 1]**2
         high = float(square)
         t.array(f"j{n}Zero{k}Squared", [high, square - mpf(high)])
-t.write(sys.argv[1] + "/special/tables/bessel.h")
+t.write(sys.argv[1] + "/src/special/tables/bessel.h")

@@ -1,5 +1,5 @@
 #!/usr/bin/python3
-"""Coefficients of the elliptic integrals, Dawson, Fresnel and zeta: special/tables/*.h.
+"""Coefficients of the elliptic integrals, Dawson, Fresnel and zeta: src/special/tables/*.h.
 
 usage: elementary.py REPOSITORY [NAME...]
 """
@@ -91,4 +91,4 @@ def riemann(folder):
 if __name__ == "__main__":
     made = {"elliptic": elliptic, "dawson": dawson, "fresnel": fresnel, "riemann": riemann}
     for name in sys.argv[2:] or made:
-        made[name](sys.argv[1] + "/special/tables/")
+        made[name](sys.argv[1] + "/src/special/tables/")

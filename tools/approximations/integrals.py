@@ -1,6 +1,6 @@
 #!/usr/bin/python3
 """Coefficients of the error function, the sine, cosine and hyperbolic integrals and the
-dilogarithm: special/tables/*.h.
+dilogarithm: src/special/tables/*.h.
 
 usage: integrals.py REPOSITORY [NAME...]
 """
@@ -128,4 +128,4 @@ if __name__ == "__main__":
     made = {"error_function": error_function, "dilogarithm": dilogarithm, "trigonometric": trigonometric,
             "hyperbolic": hyperbolic}
     for name in sys.argv[2:] or made:
-        made[name](sys.argv[1] + "/special/tables/")
+        made[name](sys.argv[1] + "/src/special/tables/")

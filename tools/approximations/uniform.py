@@ -1,5 +1,5 @@
 #!/usr/bin/python3
-"""Coefficients of the expansions for large order: special/tables/uniform.h.
+"""Coefficients of the expansions for large order: src/special/tables/uniform.h.
 
 The polynomials u_k of the expansions of Debye, exactly, and Olver's expansion about the turning
 point, whose coefficients are smooth functions of z although their formulas are singular at z = 1.
@@ -105,4 +105,4 @@ for k in range(COUNT):
     lines[-1] += "},"
     t.lines += lines
 t.lines += ["};", ""]
-t.write(sys.argv[1] + "/special/tables/uniform.h")
+t.write(sys.argv[1] + "/src/special/tables/uniform.h")

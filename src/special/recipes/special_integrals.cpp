@@ -1,0 +1,34 @@
+#include "qx/special_integrals.h"
+#include "tests/support/recipe.h"
+#include "tests/support/scalar_recipe.h"
+
+namespace qx::test {
+
+namespace {
+
+std::vector<Recipe> SpecialIntegralRecipes() {
+    return {
+        OfNumber("QX_Erf", QX_Erf),
+        OfNumber("QX_ErfC", QX_ErfC),
+        {"QX_ExpI",
+         [](Call &c) {
+             int output = 0;
+             for (const int32_t n : {0, 1, 2, 7, 200, 6000})
+                 for (const double x : {0.9 / c.n, 0.6 * c.n})
+                     QX_ExpI(x, n, c.scalar(output++));
+             return 0;
+         },
+         NoStatus},
+        OfNumber("QX_SinI", QX_SinI),
+        OfNumber("QX_CosI", QX_CosI),
+        OfNumber("QX_SinhI", QX_SinhI),
+        OfNumber("QX_CoshI", QX_CoshI),
+        OfNumber("QX_Diln", QX_Diln),
+    };
+}
+
+const RecipeFile file(SpecialIntegralRecipes);
+
+} // namespace
+
+} // namespace qx::test

@@ -1,0 +1,93 @@
+#include "qx/distributions.h"
+#include "qx/anova.h"
+#include "tests/support/recipe.h"
+
+namespace qx::test {
+
+namespace {
+
+constexpr auto DBL = ElementType::DBL;
+constexpr auto I32 = ElementType::I32;
+
+double ThreeLabels(int32_t i) { return i % 3 - 1; }
+double Counts(int32_t i) { return i * 7 % 11 + 1; }
+
+// Probabilities and quantiles that follow the size.
+double Probability(const Call &c) { return (c.n % 97 + 0.5) / 97.0; }
+double Point(const Call &c) { return c.n / 16.0 - 3.0; }
+
+std::vector<Recipe> DistributionRecipes() {
+    const std::vector<int32_t> sizes = {1, 2, 3, 17, 60, 96, 200, 5000};
+    return {
+        {"NormDist_head",
+         [](Call &c) { return NormDist_head(c.byReference(Point(c)), c.scalar(0)); }, None, sizes},
+        {"TDist_head",
+         [](Call &c) {
+             return TDist_head(c.byReference(Point(c)), c.byReference(c.n), c.scalar(0), c.err());
+         },
+         None, sizes},
+        {"FDist_head",
+         [](Call &c) {
+             return FDist_head(c.byReference(Point(c)), c.byReference(c.n), c.byReference(7),
+                               c.scalar(0), c.err());
+         },
+         None, sizes},
+        {"ChiSquare_head",
+         [](Call &c) {
+             return ChiSquare_head(c.byReference(0.9 * c.n), c.byReference(c.n), c.scalar(0),
+                                   c.err());
+         },
+         None, sizes},
+        {"InvNdist_head",
+         [](Call &c) { return InvNdist_head(c.byReference(Probability(c)), c.scalar(0), c.err()); },
+         None, sizes},
+        {"InvTdist_head",
+         [](Call &c) {
+             return InvTdist_head(c.byReference(Probability(c)), c.byReference(c.n), c.scalar(0),
+                                  c.err());
+         },
+         None, sizes},
+        {"InvFDist_head",
+         [](Call &c) {
+             return InvFDist_head(c.byReference(Probability(c)), c.byReference(c.n),
+                                  c.byReference(12), c.scalar(0), c.err());
+         },
+         None, sizes},
+        {"InvChiSquare_head",
+         [](Call &c) {
+             return InvChiSquare_head(c.byReference(Probability(c)), c.byReference(c.n),
+                                      c.scalar(0), c.err());
+         },
+         None, sizes},
+        {"Contingency_head",
+         [](Call &c) {
+             return Contingency_head(c.in2D<I32>(0, c.n, c.n + 1, Counts), c.scalar(0), c.scalar(1),
+                                     c.err());
+         },
+         None,
+         {2, 3, 50}},
+        {"Anova1Way_head",
+         [](Call &c) {
+             return Anova1Way_head(c.in<DBL>(0), c.in<I32>(1, c.n, ThreeLabels), c.byReference(3),
+                                   c.scalar(0), c.scalar(1), c.scalar(2), c.scalar(3), c.scalar(4),
+                                   c.scalar(5), c.scalar(6), c.err());
+         },
+         None,
+         {8, 50, 1000}},
+        {"Anova1Way_head_2017",
+         [](Call &c) {
+             return Anova1Way_head_2017(c.in<DBL>(0), c.in<I32>(1, c.n, ThreeLabels),
+                                        c.byReference(3), 0.05, c.scalar(0), c.scalar(1),
+                                        c.scalar(2), c.scalar(3), c.scalar(4), c.scalar(5),
+                                        c.scalar(6), c.scalar(7), c.err());
+         },
+         None,
+         {8, 50, 1000}},
+    };
+}
+
+const RecipeFile file(DistributionRecipes);
+
+} // namespace
+
+} // namespace qx::test

@@ -1,0 +1,431 @@
+#include "fft/plan_slot.h"
+#include "qx/errors.h"
+#include "qx/transforms.h"
+#include "tests/support/heap_probe.h"
+#include "tests/support/hostile_host.h"
+#include "tests/support/transform_reference.h"
+#include "transforms/dct.h"
+#include "transforms/dst.h"
+
+#include <gtest/gtest.h>
+
+#include <cmath>
+#include <fstream>
+#include <limits>
+#include <sstream>
+#include <string>
+#include <tuple>
+
+namespace {
+
+using namespace qx::test;
+
+constexpr double Rounding = 3e-15;
+
+struct Shape {
+    int32_t rows, cols;
+};
+
+// The exports of the cosine and of the sine transform, under one set of names.
+struct Family {
+    const char *name;
+    ErrorCode (*forward)(DBL1D, DBL1D, int32_t, PlanSlot *);
+    ErrorCode (*forwardIDP)(DBL1D, DBL1D, int32_t, InstanceWord *);
+    ErrorCode (*inverse)(DBL1D, DBL1D, PlanSlot *);
+    ErrorCode (*inverseIDP)(DBL1D, DBL1D, InstanceWord *);
+    ErrorCode (*forward2D)(DBL2D, DBL2D, int32_t, int32_t, PlanSlot *, PlanSlot *);
+    ErrorCode (*forward2DIDP)(DBL2D, DBL2D, int32_t, int32_t, InstanceWord *);
+    ErrorCode (*inverse2D)(DBL2D, DBL2D, PlanSlot *, PlanSlot *);
+    ErrorCode (*inverse2DIDP)(DBL2D, DBL2D, InstanceWord *);
+    LongSpectrum (*definition)(const Signal &);
+};
+
+LongSpectrum CosineSums(const Signal &x) {
+    const auto n = static_cast<int32_t>(x.size());
+    LongSpectrum sums(n);
+    for (int32_t k = 0; k < n; ++k) {
+        for (int32_t j = 0; j < n; ++j)
+            sums[k] += Long(x[j]) * Turn(int64_t{k} * (2 * j + 1), 4 * int64_t{n}).real();
+        sums[k] *= std::sqrt((k == 0 ? 1.0L : 2.0L) / n);
+    }
+    return sums;
+}
+
+LongSpectrum SineSums(const Signal &x) {
+    const auto n = static_cast<int32_t>(x.size());
+    LongSpectrum sums(n);
+    for (int32_t k = 0; k < n; ++k)
+        for (int32_t j = 0; j < n; ++j)
+            sums[k] += Long(x[j]) * Turn(int64_t{j + 1} * (k + 1), 2 * int64_t{n + 1}).imag();
+    return sums;
+}
+
+const Family Families[] = {
+    {"DCT", DCT_1DH, DCT_1DH_IDP, InvDCT_1DH, InvDCT_1DH_IDP, DCT_2DH, DCT_2DH_IDP, InvDCT_2DH,
+     InvDCT_2DH_IDP, CosineSums},
+    {"DST", DST_1DH, DST_1DH_IDP, InvDST_1DH, InvDST_1DH_IDP, DST_2DH, DST_2DH_IDP, InvDST_2DH,
+     InvDST_2DH_IDP, SineSums},
+};
+
+Signal Resized(Signal x, int32_t n) {
+    x.resize(n);
+    return x;
+}
+
+TEST(DCTDST, OneDimensionByDefinitionCroppedAndPadded) {
+    for (const Family &family : Families)
+        for (int32_t n : {1, 2, 3, 4, 5, 12, 23, 26, 53})
+            for (int32_t size : {0, -7, n, n + 1, n + 6, (n + 1) / 2}) {
+                SCOPED_TRACE(testing::Message() << family.name << " " << n << " " << size);
+                const Signal x = RandomSignal(n);
+                const DBLArray in(x);
+                DBLArray out, twin;
+                Node node;
+                ASSERT_EQ(family.forward(in.handle(), out.handle(), size, &node.slot), 0);
+                ASSERT_EQ(family.forwardIDP(in.handle(), twin.handle(), size, &node.instance), 0);
+                const Signal window = Resized(x, size < 1 ? n : size);
+                EXPECT_LT(MaxError(out.values(), family.definition(window)), Rounding);
+                EXPECT_TRUE(SameBits(out.values(), twin.values()));
+
+                DBLArray back, backTwin;
+                ASSERT_EQ(family.inverse(out.handle(), back.handle(), &node.slot), 0);
+                ASSERT_EQ(family.inverseIDP(out.handle(), backTwin.handle(), &node.instance), 0);
+                EXPECT_LT(MaxError(back.values(), ToLong(window)), Rounding);
+                EXPECT_TRUE(SameBits(back.values(), backTwin.values()));
+            }
+}
+
+TEST(DCTDST, ConstantsComeOutExactly) {
+    Node node;
+    DBLArray out;
+    ASSERT_EQ(DCT_1DH(DBLArray{1, 1, 1, 1}.handle(), out.handle(), 0, &node.slot), 0);
+    EXPECT_EQ(out[0], 2.0);
+    ASSERT_EQ(DCT_1DH(DBLArray{0.3}.handle(), out.handle(), 0, &node.slot), 0);
+    EXPECT_EQ(out[0], 0.3);
+    ASSERT_EQ(DST_1DH(DBLArray{0.3}.handle(), out.handle(), 0, &node.slot), 0);
+    EXPECT_NEAR(out[0], 0.3, 1e-16);
+}
+
+void Fill(const DBLMatrix &matrix, const Signal &values) {
+    for (int32_t i = 0; i < matrix.size(); ++i)
+        matrix.data()[i] = values[i];
+}
+
+// Rows, then columns, of the upper left part, padded with zeros.
+LongSpectrum Definition2D(const Family &family, const DBLMatrix &matrix, Shape size) {
+    std::vector<Signal> rows;
+    for (int32_t r = 0; r < size.rows; ++r) {
+        Signal row(size.cols);
+        for (int32_t c = 0; c < std::min(size.cols, matrix.cols()) && r < matrix.rows(); ++c)
+            row[c] = matrix.at(r, c);
+        const LongSpectrum sums = family.definition(row);
+        for (int32_t c = 0; c < size.cols; ++c)
+            row[c] = static_cast<double>(sums[c].real());
+        rows.push_back(row);
+    }
+    LongSpectrum result(std::size_t(size.rows) * size.cols);
+    for (int32_t c = 0; c < size.cols; ++c) {
+        Signal column;
+        for (const Signal &row : rows)
+            column.push_back(row[c]);
+        const LongSpectrum sums = family.definition(column);
+        for (int32_t r = 0; r < size.rows; ++r)
+            result[r * size.cols + c] = sums[r];
+    }
+    return result;
+}
+
+// The shapes hold an odd side that needs more work memory than the longer, even one.
+TEST(DCTDST, TwoDimensionsByDefinitionCroppedAndPadded) {
+    for (const Family &family : Families)
+        for (Shape shape : {Shape{1, 1}, {1, 5}, {4, 6}, {9, 10}, {10, 9}, {20, 3}})
+            for (Shape change : {Shape{0, 0}, {-1, 0}, {2, -1}, {0, 9}}) {
+                const Shape size{std::max(1, shape.rows + change.rows),
+                                 std::max(1, shape.cols + change.cols)};
+                SCOPED_TRACE(testing::Message()
+                             << family.name << " " << shape.rows << "x" << shape.cols << " to "
+                             << size.rows << "x" << size.cols);
+                const DBLMatrix in(shape.rows, shape.cols);
+                Fill(in, RandomSignal(in.size()));
+                DBLMatrix out, twin, back, backTwin;
+                Node node;
+                const bool keeps = change.rows == 0 && change.cols == 0;
+                ASSERT_EQ(family.forward2D(in.handle(), out.handle(), keeps ? 0 : size.rows,
+                                           keeps ? -3 : size.cols, &node.slot, &node.second),
+                          0);
+                ASSERT_EQ(family.forward2DIDP(in.handle(), twin.handle(), size.rows, size.cols,
+                                              &node.instance),
+                          0);
+                EXPECT_EQ(out.rows(), size.rows);
+                EXPECT_EQ(out.cols(), size.cols);
+                EXPECT_LT(MaxError(out.values(), Definition2D(family, in, size)), Rounding);
+                EXPECT_TRUE(SameBits(out.values(), twin.values()));
+
+                ASSERT_EQ(family.inverse2D(out.handle(), back.handle(), &node.slot, &node.second),
+                          0);
+                ASSERT_EQ(family.inverse2DIDP(out.handle(), backTwin.handle(), &node.instance), 0);
+                LongSpectrum window(out.size());
+                for (int32_t r = 0; r < std::min(size.rows, shape.rows); ++r)
+                    for (int32_t c = 0; c < std::min(size.cols, shape.cols); ++c)
+                        window[r * size.cols + c] = in.at(r, c);
+                EXPECT_LT(MaxError(back.values(), window), Rounding);
+                EXPECT_TRUE(SameBits(back.values(), backTwin.values()));
+            }
+}
+
+TEST(DCTDST, AgreeWithSciPy) {
+    std::ifstream file(QX_TEST_DATA "dct_dst.dat");
+    std::string line;
+    int lines = 0;
+    for (; std::getline(file, line); ++lines) {
+        std::istringstream fields(line);
+        std::string kind, number;
+        Shape shape{};
+        fields >> kind >> shape.rows >> shape.cols;
+        Signal numbers;
+        while (fields >> number)
+            numbers.push_back(std::strtod(number.c_str(), nullptr));
+        const std::size_t count = numbers.size() / 2;
+        const Signal input(numbers.begin(), numbers.begin() + count);
+        const LongSpectrum expected = ToLong(Signal(numbers.begin() + count, numbers.end()));
+        const Family &family = Families[kind.substr(0, 3) == "dst"];
+        Node node;
+        if (kind.size() == 3) {
+            DBLArray out;
+            ASSERT_EQ(family.forward(DBLArray(input).handle(), out.handle(), 0, &node.slot), 0);
+            EXPECT_LT(MaxError(out.values(), expected), Rounding) << line;
+        } else {
+            const DBLMatrix in(shape.rows, shape.cols);
+            Fill(in, input);
+            DBLMatrix out;
+            ASSERT_EQ(family.forward2D(in.handle(), out.handle(), 0, 0, &node.slot, &node.second),
+                      0);
+            EXPECT_LT(MaxError(out.values(), expected), Rounding) << line;
+        }
+    }
+    EXPECT_EQ(lines, 18);
+}
+
+TEST(DCTDST, FramesCheckAndQuoteTheHostInTheirOrder) {
+    const DBLArray none, x(RandomSignal(5));
+    const DBLMatrix noneMatrix(0, 2), matrix(4, 5);
+    Fill(matrix, RandomSignal(20));
+    for (const Family &family : Families) {
+        SCOPED_TRACE(family.name);
+        const bool isCosine = family.forward == DCT_1DH;
+        Node node;
+        DBLArray out(2);
+        DBLMatrix out2(1, 1);
+        EXPECT_EQ(family.forward(none.handle(), out.handle(), 4, &node.slot), ErrEmptyInput);
+        EXPECT_EQ(family.inverse(none.handle(), out.handle(), &node.slot), ErrEmptyInput);
+        EXPECT_EQ(out.size(), 0);
+        EXPECT_EQ(
+            family.forward2D(noneMatrix.handle(), out2.handle(), 3, 3, &node.slot, &node.second),
+            ErrEmptyInput);
+        EXPECT_EQ(out2.rows(), 0);
+        EXPECT_EQ(family.inverse2D(noneMatrix.handle(), out2.handle(), &node.slot, &node.second),
+                  ErrEmptyInput);
+
+        ResetHost(1, 77);
+        EXPECT_EQ(family.forward(x.handle(), out.handle(), 4, &node.slot), 77);
+        EXPECT_EQ(Host().reshapes, (std::vector<Reshape>{{10, 1, 4}, {10, 1, 0}}));
+        ResetHost(1, -4242);
+        EXPECT_EQ(family.inverse(x.handle(), out.handle(), &node.slot), -4242);
+        ResetHost();
+        EXPECT_EQ(node.slot, nullptr) << "in one dimension the output comes before the plan";
+
+        ResetHost(1, 77);
+        EXPECT_EQ(family.forward2D(matrix.handle(), out2.handle(), 0, 0, &node.slot, &node.second),
+                  77);
+        EXPECT_EQ(Host().reshapes, (std::vector<Reshape>{{10, 2, 20}, {10, 2, 0}}));
+        ResetHost();
+        EXPECT_EQ(node.slot != nullptr, isCosine) << "in two only the sine transform has it so";
+        if (isCosine) {
+            EXPECT_EQ(static_cast<const qx::PlanCell *>(node.slot)->plan->length, 4);
+            EXPECT_EQ(static_cast<const qx::PlanCell *>(node.second)->plan->length, 10);
+        }
+        Node other;
+        ResetHost(1, 77);
+        EXPECT_EQ(family.inverse2D(matrix.handle(), out2.handle(), &other.slot, &other.second), 77);
+        ResetHost();
+        EXPECT_EQ(other.second != nullptr, isCosine);
+    }
+}
+
+// What an export leaves behind when the n-th allocation from the end of the successful run fails.
+// The last allocation of the one-dimensional exports is the work block of the cosine transform
+// and the last of the plan of the sine transform.
+TEST(DCTDST, EveryFailedAllocationEndsCleanly) {
+    if (!HeapProbe::works())
+        GTEST_SKIP();
+    const DBLArray x(RandomSignal(6));
+    const DBLMatrix matrix(3, 4);
+    Fill(matrix, RandomSignal(12));
+    const auto failEach = [](auto run, bool lastIsSilent) {
+        int32_t failAt = 1;
+        int32_t silent = 0;
+        for (bool failed = true; failed; ++failAt) {
+            const HeapProbe probe(failAt);
+            {
+                Node node;
+                const auto [status, size, unwritten] = run(node);
+                failed = probe.allocations() >= failAt;
+                silent += unwritten;
+                EXPECT_LE(status != 0, failed);
+                EXPECT_EQ(status, status != 0 ? ErrOutOfMemory : 0);
+                EXPECT_EQ(size > 0, status == 0);
+            }
+            EXPECT_EQ(probe.liveAllocations(), 0) << failAt;
+        }
+        EXPECT_GT(failAt, 3);
+        EXPECT_EQ(silent, lastIsSilent ? 1 : 0);
+    };
+    for (const Family &family : Families) {
+        SCOPED_TRACE(family.name);
+        failEach(
+            [&](Node &node) {
+                DBLArray out(1);
+                const ErrorCode status = family.forward(x.handle(), out.handle(), 8, &node.slot);
+                return std::tuple(status, out.size(), out.size() > 0 && std::fabs(out[0]) < 1e-100);
+            },
+            false);
+        failEach(
+            [&](Node &node) {
+                DBLArray out(1);
+                const ErrorCode status =
+                    family.inverseIDP(x.handle(), out.handle(), &node.instance);
+                return std::tuple(status, out.size(), out.size() > 0 && std::fabs(out[0]) < 1e-100);
+            },
+            family.inverse == InvDCT_1DH);
+        failEach(
+            [&](Node &node) {
+                DBLMatrix out(1, 1);
+                const ErrorCode status =
+                    family.forward2D(matrix.handle(), out.handle(), 4, 4, &node.slot, &node.second);
+                return std::tuple(status, out.rows(), out.rows() > 0 && std::fabs(out[0]) < 1e-100);
+            },
+            false);
+        failEach(
+            [&](Node &node) {
+                DBLMatrix out(1, 1);
+                const ErrorCode status =
+                    family.inverse2DIDP(matrix.handle(), out.handle(), &node.instance);
+                return std::tuple(status, out.rows(), out.rows() > 0 && std::fabs(out[0]) < 1e-100);
+            },
+            false);
+    }
+}
+
+// Which of the plan and the work block comes first shows in the slot where only one can be had.
+TEST(DCTDST, ThePlanComesBeforeTheWorkOfTheCosineTransformOnly) {
+    if (!HeapProbe::works())
+        GTEST_SKIP();
+    const DBLArray x(RandomSignal(6));
+    for (const Family &family : Families) {
+        // A plan of this length with all its tables, so that the cell and the work block are the
+        // only allocations left.
+        Node warm;
+        DBLArray ignored;
+        ASSERT_EQ(family.forward(x.handle(), ignored.handle(), 0, &warm.slot), 0);
+        bool failed = true;
+        int withPlan = 0;
+        for (int32_t failAt = 1; failed; ++failAt) {
+            DBLArray out(1);
+            Node node;
+            {
+                const HeapProbe probe(failAt);
+                failed = family.forward(x.handle(), out.handle(), 0, &node.slot) != 0;
+            }
+            withPlan += failed && node.slot != nullptr;
+        }
+        EXPECT_EQ(withPlan, family.forward == DCT_1DH ? 1 : 0) << family.name;
+    }
+}
+
+// The two directions commute but for rounding; the bits tell which came first.
+TEST(DCTDST, InverseRunsColumnsFirstForTheCosineAndRowsFirstForTheSine) {
+    constexpr int32_t rows = 7, cols = 10;
+    const DBLMatrix in(rows, cols);
+    Fill(in, RandomSignal(in.size()));
+    for (const Family &family : Families) {
+        SCOPED_TRACE(family.name);
+        Node node;
+        Signal values(in.values());
+        const auto alongRows = [&] {
+            for (int32_t r = 0; r < rows; ++r) {
+                const DBLArray row(
+                    Signal(values.begin() + r * cols, values.begin() + (r + 1) * cols));
+                DBLArray out;
+                ASSERT_EQ(family.inverse(row.handle(), out.handle(), &node.slot), 0);
+                for (int32_t c = 0; c < cols; ++c)
+                    values[r * cols + c] = out[c];
+            }
+        };
+        const auto alongColumns = [&] {
+            for (int32_t c = 0; c < cols; ++c) {
+                DBLArray column(rows), out;
+                for (int32_t r = 0; r < rows; ++r)
+                    column.data()[r] = values[r * cols + c];
+                ASSERT_EQ(family.inverse(column.handle(), out.handle(), &node.slot), 0);
+                for (int32_t r = 0; r < rows; ++r)
+                    values[r * cols + c] = out[r];
+            }
+        };
+        if (family.inverse == InvDCT_1DH) {
+            alongColumns();
+            alongRows();
+        } else {
+            alongRows();
+            alongColumns();
+        }
+        DBLMatrix out;
+        Node other;
+        ASSERT_EQ(family.inverse2D(in.handle(), out.handle(), &other.slot, &other.second), 0);
+        EXPECT_TRUE(SameBits(out.values(), values));
+    }
+}
+
+TEST(DCTDST, InnerRoutinesCheckTheirArguments) {
+    FFTPlan *const plan = qx::create_oxfft_table(4);
+    Signal x = RandomSignal(8), out(8), work(64);
+    EXPECT_EQ(qx::DCTForward(plan, x.data(), 0, out.data(), 1, 1, 0, work.data()), ErrEmptyInput);
+    EXPECT_EQ(qx::DCTForward(plan, x.data(), 1, out.data(), 1, 1, 0, work.data()),
+              ErrFFTSizeNotPositive);
+    EXPECT_EQ(qx::DCTForward(plan, x.data(), 5, out.data(), 1, 1, 5, work.data()), ErrInternal);
+    EXPECT_EQ(qx::DCTInverse(x.data(), out.data(), 1, 1, 6, work.data(), plan), ErrInternal);
+    EXPECT_EQ(qx::DCTInverse(x.data(), out.data(), 1, 1, 0, work.data(), plan), ErrEmptyInput);
+    EXPECT_EQ(qx::DSTForward(plan, x.data(), 0, out.data(), 1, 1, 0, work.data()), ErrEmptyInput);
+    EXPECT_EQ(qx::DSTForward(plan, x.data(), 1, out.data(), 1, 1, 0, work.data()),
+              ErrFFTSizeNotPositive);
+    EXPECT_EQ(qx::DSTForward(plan, x.data(), 4, out.data(), 1, 1, 4, work.data()), ErrInternal);
+    EXPECT_EQ(qx::DSTInverse(x.data(), out.data(), 1, 1, 4, work.data(), plan), ErrInternal);
+    EXPECT_EQ(qx::DSTInverse(x.data(), out.data(), 1, 1, 0, work.data(), plan), ErrEmptyInput);
+
+    // Strides on both sides, in place, with a short input.
+    Signal strided = x;
+    ASSERT_EQ(qx::DCTForward(plan, strided.data(), 3, strided.data(), 2, 2, 4, work.data()), 0);
+    const LongSpectrum expected = CosineSums({x[0], x[2], x[4], 0});
+    EXPECT_LT(MaxError(Signal{strided[0], strided[2], strided[4], strided[6]}, expected), Rounding);
+    EXPECT_EQ(strided[1], x[1]);
+    qx::destroy_oxfft_table(plan);
+}
+
+TEST(DCTDST, RequestsBeyondMemoryEndInACode) {
+    const DBLArray x(RandomSignal(3));
+    const DBLMatrix matrix(1, 3);
+    Fill(matrix, RandomSignal(3));
+    const int32_t most = std::numeric_limits<int32_t>::max();
+    for (const Family &family : Families) {
+        DBLArray out(1);
+        DBLMatrix out2(1, 1);
+        Node node;
+        EXPECT_NE(family.forward(x.handle(), out.handle(), most, &node.slot), 0);
+        EXPECT_EQ(out.size(), 0);
+        EXPECT_NE(
+            family.forward2D(matrix.handle(), out2.handle(), most, most, &node.slot, &node.second),
+            0);
+        EXPECT_EQ(out2.rows(), 0);
+    }
+}
+
+} // namespace

@@ -1,0 +1,59 @@
+#include "tests/support/recipe.h"
+
+#include <algorithm>
+#include <cstring>
+
+namespace qx::test {
+
+namespace {
+
+struct Registry {
+    std::vector<RecipeFile::Make> files;
+    std::vector<Exempt> exempt;
+};
+
+Registry &Registered() {
+    static Registry registry;
+    return registry;
+}
+
+} // namespace
+
+RecipeFile::RecipeFile(Make make) { Registered().files.push_back(make); }
+RecipeFile::RecipeFile(std::initializer_list<Exempt> exempt) {
+    Registered().exempt.insert(Registered().exempt.end(), exempt);
+}
+
+const std::vector<Recipe> &AllRecipes() {
+    static const std::vector<Recipe> all = [] {
+        std::vector<Recipe> recipes;
+        for (const RecipeFile::Make make : Registered().files)
+            for (Recipe &recipe : make())
+                recipes.push_back(std::move(recipe));
+        // The order of the files is the linker's.
+        std::stable_sort(recipes.begin(), recipes.end(), [](const Recipe &a, const Recipe &b) {
+            return std::strcmp(a.name, b.name) < 0;
+        });
+        return recipes;
+    }();
+    return all;
+}
+
+const std::vector<Exempt> &ExemptExports() { return Registered().exempt; }
+
+std::map<std::string, ExportHash> HashEveryExport(const Caller &caller) {
+    std::map<std::string, ExportHash> hashes;
+    for (const Recipe &recipe : AllRecipes()) {
+        ExportHash &found = hashes[recipe.name];
+        found.mayDiffer |= (recipe.quirks & BitsMayDiffer) != 0;
+        for (const int32_t n : recipe.sizes) {
+            Call call(n);
+            ResetHost();
+            const ErrorCode status = call.status(caller(recipe, call));
+            found.hash = found.hash * 0x9E3779B97F4A7C15U + call.outputHash(status);
+        }
+    }
+    return hashes;
+}
+
+} // namespace qx::test
