@@ -104,23 +104,23 @@ Array2DHandle New2D(std::size_t elementSize, int32_t rows, int32_t cols, const v
 
 int32_t gQXRTVersion = 1;
 
-Array1DHandle QXHostNew1D(int32_t typeCode, int32_t count) {
+void *QXHostNew1D(int32_t typeCode, int32_t count) {
     return New1D(ElementSize(typeCode), count, nullptr);
 }
 
-Array2DHandle QXHostNew2D(int32_t typeCode, int32_t rows, int32_t cols) {
+void *QXHostNew2D(int32_t typeCode, int32_t rows, int32_t cols) {
     return New2D(ElementSize(typeCode), rows, cols, nullptr);
 }
 
-Array1DHandle QXHostCopy1D(int32_t typeCode, int32_t count, const void *elements) {
+void *QXHostCopy1D(int32_t typeCode, int32_t count, const void *elements) {
     return New1D(ElementSize(typeCode), count, elements);
 }
 
-Array2DHandle QXHostCopy2D(int32_t typeCode, int32_t rows, int32_t cols, const void *elements) {
+void *QXHostCopy2D(int32_t typeCode, int32_t rows, int32_t cols, const void *elements) {
     return New2D(ElementSize(typeCode), rows, cols, elements);
 }
 
-Array1DHandle QXHostCopyRecords(int32_t recordSize, int32_t count, const void *records) {
+void *QXHostCopyRecords(int32_t recordSize, int32_t count, const void *records) {
     return New1D(recordSize > 0 ? static_cast<std::size_t>(recordSize) : 0, count, records);
 }
 

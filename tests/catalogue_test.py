@@ -24,7 +24,7 @@ typedef struct Interval {
     Array1DHandle edges;
     int32_t spare[2];
 } Interval;
-typedef Array1DHandle Interval1D;
+typedef QX_ARRAY_1D(Interval) Interval1D;
 typedef struct Plan Plan;
 typedef void *PlanSlot;
 typedef void *InstanceWord;
@@ -132,7 +132,7 @@ class Refusing(unittest.TestCase):
         "not marked QX_API": "\n/** A. */ void f(void);",
         "does not end": "\n/** A. */ QX_API void f(void)",
         "cannot be read": "\n/** A. */ QX_API void (*f)(void)[2];",
-        "a known element or record": "\ntypedef Array1DHandle Thing1D;",
+        "a known element or record": "\ntypedef QX_ARRAY_1D(Thing) Thing1D;",
     }
 
     def test_bad_headers_are_named_with_file_and_line(self):

@@ -25,7 +25,8 @@ SCALARS = {
     "CSG": "CSG", "CDB": "CDB",
 }
 DIRECTIONS = {"QX_IN": "in", "QX_OUT": "out", "QX_INOUT": "inout"}
-HANDLE_DIMENSIONS = {"Array1DHandle": 1, "Array2DHandle": 2}
+HANDLE_DIMENSIONS = {"QX_ARRAY_1D": 1, "QX_ARRAY_2D": 2}
+UNTYPED_HANDLES = {"Array1DHandle", "Array2DHandle"}
 
 TOKEN = re.compile(
     r"(?P<comment>/\*.*?\*/|//[^\n]*)|(?P<directive>^[ \t]*\#(?:\\\n|[^\n])*)"
@@ -125,25 +126,25 @@ class Types:
         words = statement.words
         if "{" in words and words[1:2] != ["enum"]:
             self._record(path, statement)
+        elif words[1] in HANDLE_DIMENSIONS:
+            self._handle(path, statement.line, words)
         elif "(" in without_attributes(words):
             match = re.search(r"\( \* (\w+) \)", " ".join(words))
             if not match:
                 raise HeaderError(path, statement.line, "a typedef that cannot be read")
             self.procedures.add(match.group(1))
-        elif words[1] in HANDLE_DIMENSIONS:
-            for part in split(words[2:]):
-                self._handle(path, statement.line, words[1], part)
         elif words[1:3] == ["void", "*"] or (words[1] == "struct" and len(words) == 4):
             self.opaque.add(words[3])
 
-    def _handle(self, path, line, base, part):
-        dimensions = HANDLE_DIMENSIONS[base]
-        match = re.fullmatch(rf"(\w+?)_?{dimensions}D", part[0]) if len(part) == 1 else None
-        element = match.group(1) if match else None
-        if element not in SCALARS and element not in self.records:
-            raise HeaderError(path, line, f"handle type {' '.join(part)}: its name must be a known"
+    def _handle(self, path, line, words):
+        dimensions = HANDLE_DIMENSIONS[words[1]]
+        match = re.fullmatch(r"QX_ARRAY_\dD \( (\w+) \) (\w+)", " ".join(words[1:]))
+        element, name = match.groups() if match else (None, spelled(words[1:]))
+        if (element not in SCALARS and element not in self.records) or (
+                name not in (f"{element}{dimensions}D", f"{element}_{dimensions}D")):
+            raise HeaderError(path, line, f"handle type {name}: its name must be a known"
                               f" element or record and {dimensions}D")
-        self.handles[part[0]] = (dimensions, element)
+        self.handles[name] = (dimensions, element)
 
     def _record(self, path, statement):
         words = statement.words
@@ -204,7 +205,7 @@ def argument_of(words, types):
     base = base[0]
     argument = {"name": name, "type": spelled(kind_words), "direction": direction or "in"}
 
-    if base in HANDLE_DIMENSIONS:
+    if base in UNTYPED_HANDLES:
         raise ValueError(f"argument '{text}': a handle type that names its element is needed")
     if base in types.handles and stars == 0:
         dimensions, argument["element"] = types.handles[base]

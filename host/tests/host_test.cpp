@@ -20,7 +20,7 @@ constexpr std::size_t sizes[] = {4, 1, 4, 4, 8, 8, 16};
 
 TEST(Blocks, KeepTheirElementsThroughGrowthAndShrinking) {
     for (std::size_t type = 0; type < std::size(allTypes); ++type) {
-        Array1DHandle array = QXHostNew1D(allTypes[type], 5);
+        auto *array = static_cast<Array1DHandle>(QXHostNew1D(allTypes[type], 5));
         ASSERT_NE(array, nullptr);
         EXPECT_EQ((*array)->dimSize, 5);
         EXPECT_EQ(static_cast<char *>(QXHostElements1D(array)) - reinterpret_cast<char *>(*array),
@@ -48,7 +48,7 @@ TEST(Blocks, KeepTheirElementsThroughGrowthAndShrinking) {
 }
 
 TEST(Blocks, GiveMemoryBackWhereItIsWorthAMove) {
-    Array1DHandle array = QXHostNew1D(QXTypeDBL, 10000);
+    auto *array = static_cast<Array1DHandle>(QXHostNew1D(QXTypeDBL, 10000));
     const auto stays = [&](int32_t count) {
         const void *const before = *array;
         EXPECT_EQ(HostBlockReshape(QXTypeDBL, 1, &array, count), 0);
@@ -64,7 +64,7 @@ TEST(Blocks, GiveMemoryBackWhereItIsWorthAMove) {
 
 TEST(Blocks, OfTwoDimensionsStartAtByteEight) {
     const double values[] = {1, 2, 3, 4, 5, 6};
-    Array2DHandle array = QXHostCopy2D(QXTypeDBL, 2, 3, values);
+    auto *array = static_cast<Array2DHandle>(QXHostCopy2D(QXTypeDBL, 2, 3, values));
     const char *block = reinterpret_cast<char *>(*array);
     double last;
     std::memcpy(&last, block + 8 + 5 * 8, sizeof last);
@@ -75,7 +75,7 @@ TEST(Blocks, OfTwoDimensionsStartAtByteEight) {
 }
 
 TEST(Blocks, RefuseWhatCannotBe) {
-    Array1DHandle array = QXHostNew1D(QXTypeDBL, 2);
+    auto *array = static_cast<Array1DHandle>(QXHostNew1D(QXTypeDBL, 2));
     Array1DHandle none = nullptr;
     static_cast<double *>(QXHostElements1D(array))[1] = 7;
     EXPECT_EQ(HostBlockReshape(QXTypeDBL, 1, &array, -1), QXHostBadArgument);
@@ -103,7 +103,7 @@ TEST(Blocks, RefuseWhatCannotBe) {
 
 TEST(Arrays, OfTheCppLayerOwnTheirBlocks) {
     Array1D<double> x{1.5, -2.5};
-    const Array1DHandle handle = x.handle();
+    const DBL1D handle = x.handle();
     Array1D<double> y(std::move(x));
     EXPECT_EQ(y.handle(), handle);
     x = std::move(y);

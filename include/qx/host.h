@@ -35,21 +35,25 @@ enum QXHostStatus {
    with QXHostFree; null is allowed there. */
 
 /* Elements of one of the codes of QXTypeCode, all zero. */
-QX_HOST_API Array1DHandle QXHostNew1D(int32_t typeCode, int32_t count);
-QX_HOST_API Array2DHandle QXHostNew2D(int32_t typeCode, int32_t rows, int32_t cols);
+QX_HOST_API void *QXHostNew1D(int32_t typeCode, int32_t count);
+QX_HOST_API void *QXHostNew2D(int32_t typeCode, int32_t rows, int32_t cols);
 /* The same with the elements copied from memory of the caller's. */
-QX_HOST_API Array1DHandle QXHostCopy1D(int32_t typeCode, int32_t count, const void *elements);
-QX_HOST_API Array2DHandle QXHostCopy2D(int32_t typeCode, int32_t rows, int32_t cols,
+QX_HOST_API void *QXHostCopy1D(int32_t typeCode, int32_t count, const void *elements);
+QX_HOST_API void *QXHostCopy2D(int32_t typeCode, int32_t rows, int32_t cols,
                                        const void *elements);
 /* Records of the caller's, for the exports that take an array of them. Such an array cannot be
    resized. */
-QX_HOST_API Array1DHandle QXHostCopyRecords(int32_t recordSize, int32_t count, const void *records);
+QX_HOST_API void *QXHostCopyRecords(int32_t recordSize, int32_t count, const void *records);
 QX_HOST_API void QXHostFree(void *handle);
 
 /* The first element. It moves with every resize, so with every call that has the array as an
    output. */
-static inline void *QXHostElements1D(Array1DHandle array) { return *array + 1; }
-static inline void *QXHostElements2D(Array2DHandle array) { return *array + 1; }
+static inline void *QXHostElements1D(const void *array) {
+    return *(Array1DBlock *const *)array + 1;
+}
+static inline void *QXHostElements2D(const void *array) {
+    return *(Array2DBlock *const *)array + 1;
+}
 
 /* Called by the exports. Makes room for `count` elements, 0 or a status. The block may move; its
    old elements are kept as far as they fit, new ones are not set, and the dimension fields are

@@ -39,36 +39,65 @@ inline ErrorCode check(ErrorCode code) {
     return code;
 }
 
-// The element types of arrays with their type codes.
+// The element types of arrays with their type codes and handle types.
 template <class T>
-inline constexpr int32_t typeCode = 0;
+struct Element {};
 template <>
-inline constexpr int32_t typeCode<int32_t> = QXTypeI32;
+struct Element<int32_t> {
+    static constexpr int32_t typeCode = QXTypeI32;
+    typedef I32_1D Handle1D;
+    typedef I32_2D Handle2D;
+};
 template <>
-inline constexpr int32_t typeCode<uint8_t> = QXTypeU8;
+struct Element<uint8_t> {
+    static constexpr int32_t typeCode = QXTypeU8;
+    typedef U8_1D Handle1D;
+    typedef Array2DHandle Handle2D;
+};
 template <>
-inline constexpr int32_t typeCode<uint32_t> = QXTypeU32;
+struct Element<uint32_t> {
+    static constexpr int32_t typeCode = QXTypeU32;
+    typedef U32_1D Handle1D;
+    typedef Array2DHandle Handle2D;
+};
 template <>
-inline constexpr int32_t typeCode<float> = QXTypeSGL;
+struct Element<float> {
+    static constexpr int32_t typeCode = QXTypeSGL;
+    typedef SGL1D Handle1D;
+    typedef Array2DHandle Handle2D;
+};
 template <>
-inline constexpr int32_t typeCode<double> = QXTypeDBL;
+struct Element<double> {
+    static constexpr int32_t typeCode = QXTypeDBL;
+    typedef DBL1D Handle1D;
+    typedef DBL2D Handle2D;
+};
 template <>
-inline constexpr int32_t typeCode<std::complex<float>> = QXTypeCSG;
+struct Element<std::complex<float>> {
+    static constexpr int32_t typeCode = QXTypeCSG;
+    typedef CSG1D Handle1D;
+    typedef Array2DHandle Handle2D;
+};
 template <>
-inline constexpr int32_t typeCode<std::complex<double>> = QXTypeCDB;
+struct Element<std::complex<double>> {
+    static constexpr int32_t typeCode = QXTypeCDB;
+    typedef CDB1D Handle1D;
+    typedef CDB2D Handle2D;
+};
 
 // An array of one dimension. The handle stays the same for the array's life, while pointers,
 // spans and references to elements hold until the next call that has the array as an output.
 template <class T>
 class Array1D {
-    static_assert(typeCode<T> != 0, "no element type of the host");
+    static constexpr int32_t code = Element<T>::typeCode;
+    typedef typename Element<T>::Handle1D Handle;
 
 public:
-    explicit Array1D(int32_t n = 0) : handle_(owned(QXHostNew1D(typeCode<T>, n))) {}
+    explicit Array1D(int32_t n = 0) : handle_(owned(QXHostNew1D(code, n))) {}
     explicit Array1D(std::span<const T> values)
         : handle_(owned(
               values.size() <= INT32_MAX
-                  ? QXHostCopy1D(typeCode<T>, static_cast<int32_t>(values.size()), values.data())
+                  ? QXHostCopy1D(code, static_cast<int32_t>(values.size()), values.data())
                   : nullptr)) {}
     Array1D(std::initializer_list<T> values)
         : Array1D(std::span<const T>(values.begin(), values.size())) {}
@@ -79,7 +108,7 @@ public:
     }
     ~Array1D() { QXHostFree(handle_); }
 
-    Array1DHandle handle() const { return handle_; }
+    Handle handle() const { return handle_; }
     int32_t size() const { return (*handle_)->dimSize; }
     T *data() const { return static_cast<T *>(QXHostElements1D(handle_)); }
     T &operator[](std::ptrdiff_t i) const { return data()[i]; }
@@ -88,26 +117,27 @@ public:
     T *end() const { return data() + size(); }
 
 private:
-    static Array1DHandle owned(Array1DHandle handle) {
+    static Handle owned(void *handle) {
         if (handle == nullptr)
             throw std::bad_alloc();
-        return handle;
+        return static_cast<Handle>(handle);
     }
-    Array1DHandle handle_;
+    Handle handle_;
 };
 
 // An array of two dimensions, row after row.
 template <class T>
 class Array2D {
-    static_assert(typeCode<T> != 0, "no element type of the host");
+    static constexpr int32_t code = Element<T>::typeCode;
+    typedef typename Element<T>::Handle2D Handle;
 
 public:
     explicit Array2D(int32_t rows = 0, int32_t cols = 0)
-        : handle_(owned(QXHostNew2D(typeCode<T>, rows, cols))) {}
+        : handle_(owned(QXHostNew2D(code, rows, cols))) {}
     // The values row after row; their number must be rows times cols.
     Array2D(int32_t rows, int32_t cols, std::span<const T> values)
         : handle_(owned(int64_t{rows} * cols == static_cast<int64_t>(values.size())
-                            ? QXHostCopy2D(typeCode<T>, rows, cols, values.data())
+                            ? QXHostCopy2D(code, rows, cols, values.data())
                             : throw std::invalid_argument("rows times cols values are needed"))) {}
     Array2D(Array2D &&other) noexcept : handle_(std::exchange(other.handle_, nullptr)) {}
     Array2D &operator=(Array2D &&other) noexcept {
@@ -116,7 +146,7 @@ public:
     }
     ~Array2D() { QXHostFree(handle_); }
 
-    Array2DHandle handle() const { return handle_; }
+    Handle handle() const { return handle_; }
     int32_t rows() const { return (*handle_)->dimSizes[0]; }
     int32_t cols() const { return (*handle_)->dimSizes[1]; }
     T *data() const { return static_cast<T *>(QXHostElements2D(handle_)); }
@@ -124,12 +154,12 @@ public:
     std::span<T> row(int32_t row) const { return {&at(row, 0), static_cast<std::size_t>(cols())}; }
 
 private:
-    static Array2DHandle owned(Array2DHandle handle) {
+    static Handle owned(void *handle) {
         if (handle == nullptr)
             throw std::bad_alloc();
-        return handle;
+        return static_cast<Handle>(handle);
     }
-    Array2DHandle handle_;
+    Handle handle_;
 };
 
 // The word in which a call site keeps its plan from call to call: SpectrumH(x, plan.address()).

@@ -50,7 +50,7 @@ typedef struct HistInterval {
 } HistInterval;
 
 /* An array of HistInterval: a one-dimensional block of records. */
-typedef Array1DHandle HistInterval1D;
+typedef QX_ARRAY_1D(HistInterval) HistInterval1D;
 
 typedef struct HistSummary {
     int32_t outside; /* samples in no interval */

@@ -59,22 +59,40 @@ enum QXTypeCode {
 };
 
 /* A host block of one dimension: the count, then the elements from byte 4. */
-typedef struct Array1DBlock {
+typedef struct __attribute__((may_alias)) Array1DBlock {
     int32_t dimSize;
 } Array1DBlock;
 
 /* A host block of two dimensions: rows, columns, then the elements from byte 8, row after row. */
-typedef struct Array2DBlock {
+typedef struct __attribute__((may_alias)) Array2DBlock {
     int32_t dimSizes[2];
 } Array2DBlock;
 
-/* The host owns the blocks and may move one in any resize, so they are passed by handle. */
+/* The host owns the blocks and may move one in any resize, so they are passed by handle: a pointer
+   to the pointer to the block. Each element has a handle type of its own, so that the compiler
+   refuses an array of the wrong element. */
+#define QX_ARRAY_1D(element)                                                                       \
+    struct __attribute__((may_alias)) QXArray1D_##element {                                        \
+        int32_t dimSize;                                                                           \
+    } **
+#define QX_ARRAY_2D(element)                                                                       \
+    struct __attribute__((may_alias)) QXArray2D_##element {                                        \
+        int32_t dimSizes[2];                                                                       \
+    } **
+typedef QX_ARRAY_1D(I32) I32_1D;
+typedef QX_ARRAY_1D(U8) U8_1D;
+typedef QX_ARRAY_1D(U32) U32_1D;
+typedef QX_ARRAY_1D(SGL) SGL1D;
+typedef QX_ARRAY_1D(DBL) DBL1D;
+typedef QX_ARRAY_1D(CSG) CSG1D;
+typedef QX_ARRAY_1D(CDB) CDB1D;
+typedef QX_ARRAY_2D(I32) I32_2D;
+typedef QX_ARRAY_2D(DBL) DBL2D;
+typedef QX_ARRAY_2D(CDB) CDB2D;
+
+/* A handle of any element, for hosts. */
 typedef Array1DBlock **Array1DHandle;
 typedef Array2DBlock **Array2DHandle;
-
-/* Handles under the name of their element, which makes a declaration say what it takes. */
-typedef Array1DHandle I32_1D, U8_1D, U32_1D, SGL1D, DBL1D, CSG1D, CDB1D;
-typedef Array2DHandle I32_2D, DBL2D, CDB2D;
 
 /* What the four workspace exports report into; packed by the host. */
 typedef struct __attribute__((packed)) WorkspaceStatus {

@@ -1,37 +1,14 @@
 #ifndef QX_FRAME_FINISH_H
 #define QX_FRAME_FINISH_H
 
+#include "frame/outcome.h"
 #include "qx/errors.h"
 #include "qx/types.h"
 
 #include <cstdint>
 #include <cstring>
-#include <initializer_list>
 
 namespace qx {
-
-// One check of a frame: the code applies where `failed` holds.
-struct Check {
-    bool failed;
-    ErrorCode code;
-};
-
-// The first failed check decides: the rule of nearly all exports.
-inline ErrorCode FirstFailed(std::initializer_list<Check> checks) {
-    for (const Check &check : checks)
-        if (check.failed)
-            return check.code;
-    return 0;
-}
-
-// All checks run and the last failed one decides: the rule of some older exports.
-inline ErrorCode LastFailed(std::initializer_list<Check> checks) {
-    ErrorCode status = 0;
-    for (const Check &check : checks)
-        if (check.failed)
-            status = check.code;
-    return status;
-}
 
 // The end of a frame: a failure empties every output, in argument order, also those that were
 // not reached; success and warnings leave them.

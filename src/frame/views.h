@@ -1,6 +1,7 @@
 #ifndef QX_FRAME_VIEWS_H
 #define QX_FRAME_VIEWS_H
 
+#include "frame/arrays.h"
 #include "frame/elements.h"
 #include "frame/host_binding.h"
 #include "qx/errors.h"
@@ -9,15 +10,22 @@
 
 namespace qx {
 
+// The views that frame/arrays.h replaces.
+//
 // Views of host arrays. They hold the handle and read the block through it at every use, so
 // that no pointer outlives a resize. Handles are never null and are not tested.
+
+template <class Handle, ElementType Code, int Dimensions>
+concept HandleOf = HandleTraits<Handle>::code == Code && HandleTraits<Handle>::dimensions == Dimensions;
 
 template <ElementType Code>
 class In1D {
 public:
     typedef typename Element<Code>::type T;
 
-    explicit In1D(Array1DHandle handle) : handle_(handle) {}
+    template <class Handle>
+        requires HandleOf<Handle, Code, 1>
+    explicit In1D(Handle handle) : handle_(reinterpret_cast<Array1DHandle>(handle)) {}
     int32_t size() const { return (*handle_)->dimSize; }
     const T *data() const { return reinterpret_cast<const T *>(&(*handle_)[1]); }
 
@@ -30,7 +38,9 @@ class In2D {
 public:
     typedef typename Element<Code>::type T;
 
-    explicit In2D(Array2DHandle handle) : handle_(handle) {}
+    template <class Handle>
+        requires HandleOf<Handle, Code, 2>
+    explicit In2D(Handle handle) : handle_(reinterpret_cast<Array2DHandle>(handle)) {}
     int32_t rows() const { return (*handle_)->dimSizes[0]; }
     int32_t cols() const { return (*handle_)->dimSizes[1]; }
     bool isEmpty() const { return rows() < 1 || cols() < 1; }
@@ -50,7 +60,9 @@ class Out1D {
 public:
     typedef typename Element<Code>::type T;
 
-    explicit Out1D(Array1DHandle &handle) : handle_(handle) {}
+    template <class Handle>
+        requires HandleOf<Handle, Code, 1>
+    explicit Out1D(Handle &handle) : handle_(reinterpret_cast<Array1DHandle &>(handle)) {}
     int32_t size() const { return (*handle_)->dimSize; }
     T *data() const { return reinterpret_cast<T *>(&(*handle_)[1]); }
 
@@ -79,7 +91,9 @@ class Out2D {
 public:
     typedef typename Element<Code>::type T;
 
-    explicit Out2D(Array2DHandle &handle) : handle_(handle) {}
+    template <class Handle>
+        requires HandleOf<Handle, Code, 2>
+    explicit Out2D(Handle &handle) : handle_(reinterpret_cast<Array2DHandle &>(handle)) {}
     int32_t rows() const { return (*handle_)->dimSizes[0]; }
     int32_t cols() const { return (*handle_)->dimSizes[1]; }
     T *data() const { return reinterpret_cast<T *>(&(*handle_)[1]); }

@@ -67,6 +67,28 @@ struct Plain<ElementType::U32> {
     typedef uint32_t type;
 };
 
+// The handle type of an element.
+template <ElementType Code>
+struct Handles;
+#define QX_TEST_HANDLES(element, one, two)                                                         \
+    template <>                                                                                    \
+    struct Handles<ElementType::element> {                                                         \
+        typedef one OneD;                                                                          \
+        typedef two TwoD;                                                                          \
+    };
+QX_TEST_HANDLES(I32, I32_1D, I32_2D)
+QX_TEST_HANDLES(U8, U8_1D, void)
+QX_TEST_HANDLES(U32, U32_1D, void)
+QX_TEST_HANDLES(SGL, SGL1D, void)
+QX_TEST_HANDLES(DBL, DBL1D, DBL2D)
+QX_TEST_HANDLES(CSG, CSG1D, void)
+QX_TEST_HANDLES(CDB, CDB1D, CDB2D)
+#undef QX_TEST_HANDLES
+template <ElementType Code>
+using Handle1D = typename Handles<Code>::OneD;
+template <ElementType Code>
+using Handle2D = typename Handles<Code>::TwoD;
+
 namespace detail {
 void *NewBlock(int32_t numDims, std::size_t elementSize, int32_t rows, int32_t cols);
 void FreeBlock(void *handle);
@@ -82,7 +104,7 @@ public:
     typedef typename Plain<Code>::type Value;
 
     explicit Array1D(int32_t n = 0)
-        : handle_(static_cast<Array1DHandle>(detail::NewBlock(1, sizeof(T), n, 0))) {}
+        : handle_(static_cast<Handle1D<Code>>(detail::NewBlock(1, sizeof(T), n, 0))) {}
     Array1D(std::initializer_list<Value> values) : Array1D(static_cast<int32_t>(values.size())) {
         assign(values);
     }
@@ -94,7 +116,7 @@ public:
     Array1D(const Array1D &) = delete;
     Array1D &operator=(const Array1D &) = delete;
 
-    Array1DHandle handle() const { return handle_; }
+    Handle1D<Code> handle() const { return handle_; }
     int32_t size() const { return (*handle_)->dimSize; }
     T *data() const { return reinterpret_cast<T *>(*handle_ + 1); }
     // By value: a reference would bind to an address without the alignment of its type.
@@ -108,7 +130,7 @@ private:
         for (const Value &value : values)
             *next++ = value;
     }
-    Array1DHandle handle_;
+    Handle1D<Code> handle_;
 };
 
 template <ElementType Code>
@@ -118,12 +140,12 @@ public:
     typedef typename Plain<Code>::type Value;
 
     Array2D(int32_t rows = 0, int32_t cols = 0)
-        : handle_(static_cast<Array2DHandle>(detail::NewBlock(2, sizeof(T), rows, cols))) {}
+        : handle_(static_cast<Handle2D<Code>>(detail::NewBlock(2, sizeof(T), rows, cols))) {}
     ~Array2D() { detail::FreeBlock(handle_); }
     Array2D(const Array2D &) = delete;
     Array2D &operator=(const Array2D &) = delete;
 
-    Array2DHandle handle() const { return handle_; }
+    Handle2D<Code> handle() const { return handle_; }
     int32_t rows() const { return (*handle_)->dimSizes[0]; }
     int32_t cols() const { return (*handle_)->dimSizes[1]; }
     int32_t size() const { return rows() * cols(); }
@@ -134,7 +156,7 @@ public:
     std::vector<Value> values() const { return std::vector<Value>(data(), data() + size()); }
 
 private:
-    Array2DHandle handle_;
+    Handle2D<Code> handle_;
 };
 
 using DBLArray = Array1D<ElementType::DBL>;

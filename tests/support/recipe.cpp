@@ -45,12 +45,12 @@ void Call::remember(Array &array) {
     array.before.assign(array.block(), array.block() + array.blockSize());
 }
 
-Array1DHandle Call::inRecords(int number, int32_t count, const void *records, std::size_t bytes) {
+void *Call::makeRecords(int number, int32_t count, const void *records, std::size_t bytes) {
     const HeapProbe::Pause pause;
     const int32_t stored = countOf(number, count);
     auto array = std::make_unique<Array1<ElementType::U8>>(static_cast<int32_t>(bytes));
     std::memcpy(array->array.data(), records, bytes);
-    const Array1DHandle handle = array->array.handle();
+    const U8_1D handle = array->array.handle();
     (*handle)->dimSize = stored; // of records; the block is as long as their bytes
     remember(*array);
     inputs_[number] = std::move(array);

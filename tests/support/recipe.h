@@ -57,36 +57,40 @@ public:
 
     // Input arrays, read only: noise in [-1, 1), or what `value(i)` gives.
     template <ElementType Code>
-    Array1DHandle in(int number) {
+    Handle1D<Code> in(int number) {
         return in<Code>(number, n);
     }
     template <ElementType Code>
-    Array1DHandle in(int number, int32_t count, double (*value)(int32_t) = nullptr);
+    Handle1D<Code> in(int number, int32_t count, double (*value)(int32_t) = nullptr);
     template <ElementType Code>
-    Array2DHandle in2D(int number, int32_t rows, int32_t cols, double (*value)(int32_t) = nullptr);
+    Handle2D<Code> in2D(int number, int32_t rows, int32_t cols, double (*value)(int32_t) = nullptr);
     // A 1-D block of records, `bytes` in all.
-    Array1DHandle inRecords(int number, int32_t count, const void *records, std::size_t bytes);
+    // Named by the handle type: c.inRecords<HistInterval1D>(1, 3, intervals, sizeof intervals).
+    template <class Handle>
+    Handle inRecords(int number, int32_t count, const void *records, std::size_t bytes) {
+        return static_cast<Handle>(makeRecords(number, count, records, bytes));
+    }
 
     // Output arrays. They hold rubbish of a few elements before the call.
     template <ElementType Code>
-    Array1DHandle out(int number);
+    Handle1D<Code> out(int number);
     template <ElementType Code>
-    Array2DHandle out2D(int number);
+    Handle2D<Code> out2D(int number);
     // Arrays that are input and output at once: a failure empties them, too, unless the export
     // promises otherwise.
     template <ElementType Code>
-    Array1DHandle inOut(int number) {
+    Handle1D<Code> inOut(int number) {
         return inOut<Code>(number, n);
     }
     template <ElementType Code>
-    Array1DHandle inOut(int number, int32_t count, double (*value)(int32_t) = nullptr);
+    Handle1D<Code> inOut(int number, int32_t count, double (*value)(int32_t) = nullptr);
     // An input that the export is known to write into; its content afterwards is an output.
     template <ElementType Code>
-    Array1DHandle spoiled(int number) {
+    Handle1D<Code> spoiled(int number) {
         return spoiled<Code>(number, n);
     }
     template <ElementType Code>
-    Array1DHandle spoiled(int number, int32_t count, double (*value)(int32_t) = nullptr);
+    Handle1D<Code> spoiled(int number, int32_t count, double (*value)(int32_t) = nullptr);
 
     // Scalar outputs: a failure leaves the quiet NaN, or for integers 0.
     double *scalar(int number);
@@ -140,7 +144,8 @@ private:
     typedef std::map<int, std::unique_ptr<Array>> Arrays;
 
     template <ElementType Code>
-    Array1DHandle make(Arrays &arrays, int number, int32_t count, double (*value)(int32_t));
+    Handle1D<Code> make(Arrays &arrays, int number, int32_t count, double (*value)(int32_t));
+    void *makeRecords(int number, int32_t count, const void *records, std::size_t bytes);
     int32_t countOf(int number, int32_t count) { return number == emptyInput_ ? 0 : count; }
     static void remember(Array &array);
 

@@ -61,57 +61,57 @@ struct Call::Array2 : Call::Array {
 };
 
 template <ElementType Code>
-Array1DHandle Call::make(Arrays &arrays, int number, int32_t count, double (*value)(int32_t)) {
+Handle1D<Code> Call::make(Arrays &arrays, int number, int32_t count, double (*value)(int32_t)) {
     const HeapProbe::Pause pause;
     auto array = std::make_unique<Array1<Code>>(countOf(number, count));
     detail::Fill(array->array.data(), array->array.size(), number, value);
     remember(*array);
-    const Array1DHandle handle = array->array.handle();
+    const Handle1D<Code> handle = array->array.handle();
     arrays[number] = std::move(array);
     return handle;
 }
 
 template <ElementType Code>
-Array1DHandle Call::in(int number, int32_t count, double (*value)(int32_t)) {
+Handle1D<Code> Call::in(int number, int32_t count, double (*value)(int32_t)) {
     return make<Code>(inputs_, number, count, value);
 }
 
 template <ElementType Code>
-Array2DHandle Call::in2D(int number, int32_t rows, int32_t cols, double (*value)(int32_t)) {
+Handle2D<Code> Call::in2D(int number, int32_t rows, int32_t cols, double (*value)(int32_t)) {
     const HeapProbe::Pause pause;
     auto array = std::make_unique<Array2<Code>>(countOf(number, rows), countOf(number, cols));
     detail::Fill(array->array.data(), array->array.size(), number, value);
     remember(*array);
-    const Array2DHandle handle = array->array.handle();
+    const Handle2D<Code> handle = array->array.handle();
     inputs_[number] = std::move(array);
     return handle;
 }
 
 template <ElementType Code>
-Array1DHandle Call::out(int number) {
+Handle1D<Code> Call::out(int number) {
     const HeapProbe::Pause pause;
     auto array = std::make_unique<Array1<Code>>(3);
-    const Array1DHandle handle = array->array.handle();
+    const Handle1D<Code> handle = array->array.handle();
     outputs_[number] = std::move(array);
     return handle;
 }
 
 template <ElementType Code>
-Array2DHandle Call::out2D(int number) {
+Handle2D<Code> Call::out2D(int number) {
     const HeapProbe::Pause pause;
     auto array = std::make_unique<Array2<Code>>(1, 2);
-    const Array2DHandle handle = array->array.handle();
+    const Handle2D<Code> handle = array->array.handle();
     outputs_[number] = std::move(array);
     return handle;
 }
 
 template <ElementType Code>
-Array1DHandle Call::inOut(int number, int32_t count, double (*value)(int32_t)) {
+Handle1D<Code> Call::inOut(int number, int32_t count, double (*value)(int32_t)) {
     return make<Code>(inOuts_, number, count, value);
 }
 
 template <ElementType Code>
-Array1DHandle Call::spoiled(int number, int32_t count, double (*value)(int32_t)) {
+Handle1D<Code> Call::spoiled(int number, int32_t count, double (*value)(int32_t)) {
     return make<Code>(spoiled_, number, count, value);
 }
 

@@ -19,19 +19,19 @@ static_assert(offsetof(WorkspaceStatus, code) == 1);
 
 TEST(Frame, ElementsStandAtFourAndEight) {
     qx::test::DBLArray x(5);
-    Array1DHandle handle = x.handle();
+    auto handle = x.handle();
     const qx::In1D<ElementType::DBL> in(handle);
     EXPECT_EQ(reinterpret_cast<const char *>(in.data()) - reinterpret_cast<char *>(*handle), 4);
 
     qx::test::DBLMatrix a(2, 3);
-    Array2DHandle matrix = a.handle();
+    auto matrix = a.handle();
     const qx::Out2D<ElementType::DBL> out(matrix);
     EXPECT_EQ(reinterpret_cast<char *>(&out.data()[3]) - reinterpret_cast<char *>(*matrix), 32);
 }
 
 TEST(Frame, ViewsFollowABlockThatMoves) {
     qx::test::DBLArray x{1.5, 2.5};
-    Array1DHandle handle = x.handle();
+    auto handle = x.handle();
     const qx::InOut1D<ElementType::DBL> view(handle);
     const void *before = view.data();
     ASSERT_EQ(view.resize(3), 0);
@@ -44,9 +44,9 @@ TEST(Frame, AFailureEmptiesEveryOutputInOrderUnderItsOwnCode) {
     qx::test::DBLArray x(3);
     qx::test::I32Array i(3);
     qx::test::CDBMatrix m(2, 2);
-    Array1DHandle hx = x.handle();
-    Array1DHandle hi = i.handle();
-    Array2DHandle hm = m.handle();
+    auto hx = x.handle();
+    auto hi = i.handle();
+    auto hm = m.handle();
     const qx::Out1D<ElementType::DBL, ElementType::CDB> first(hx);
     const qx::Out1D<ElementType::I32> second(hi);
     const qx::Out2D<ElementType::CDB> third(hm);
@@ -66,7 +66,7 @@ TEST(Frame, AFailureEmptiesEveryOutputInOrderUnderItsOwnCode) {
 
 TEST(Frame, AHostStatusIsTranslatedOrPassedOn) {
     qx::test::DBLArray x(1);
-    Array1DHandle handle = x.handle();
+    auto handle = x.handle();
     const qx::Out1D<ElementType::DBL> out(handle);
     qx::test::ResetHost(1, 77);
     EXPECT_EQ(out.resize(4), ErrOutOfMemory);
@@ -78,7 +78,7 @@ TEST(Frame, AHostStatusIsTranslatedOrPassedOn) {
     EXPECT_EQ(x.size(), 0);
 
     qx::test::DBLMatrix m(1, 1);
-    Array2DHandle matrix = m.handle();
+    auto matrix = m.handle();
     EXPECT_EQ(qx::Out2D<ElementType::DBL>(matrix).resize(65536, 65537), ErrOutOfMemory)
         << "the product does not fit into the host's count";
 }

@@ -1,39 +1,37 @@
-#include "qx/stats.h"
-
-#include "frame/finish.h"
-#include "frame/views.h"
 #include "stats/basic.h"
 
+#include "frame/export.h"
+#include "qx/stats.h"
+
+namespace qx {
 namespace {
 
-using DBLIn = qx::In1D<qx::ElementType::DBL>;
-using CDBIn = qx::In1D<qx::ElementType::CDB>;
+ErrorCode Mean(In<DBL1D> x, OutDBL mean) { return ArrayMean(x.data(), x.size(), mean.address()); }
+ErrorCode RMS(In<DBL1D> x, OutDBL rms) { return ArrayRMS(x.data(), x.size(), rms.address()); }
+ErrorCode CxRMS(In<CDB1D> z, OutDBL rms) { return ArrayCxRMS(z.data(), z.size(), rms.address()); }
+ErrorCode MSE(In<DBL1D> x, In<DBL1D> y, OutDBL mse) {
+    return ArrayMSE(x.data(), x.size(), y.data(), y.size(), mse.address());
+}
+ErrorCode Moment(In<DBL1D> x, int32_t order, OutDBL moment) {
+    return ArrayMoment(x.data(), x.size(), order, moment.address());
+}
 
 } // namespace
+} // namespace qx
 
-int32_t Mean_head(DBL1D x, DBL *mean, ErrorCode *err) {
-    const DBLIn in(x);
-    return qx::Report(err, qx::ArrayMean(in.data(), in.size(), mean), mean);
-}
+using qx::InErr;
+using qx::Returned;
 
-int32_t RMS_head(DBL1D x, DBL *rms, ErrorCode *err) {
-    const DBLIn in(x);
-    return qx::Report(err, qx::ArrayRMS(in.data(), in.size(), rms), rms);
-}
+int32_t Mean_head(DBL1D x, DBL *mean, ErrorCode *err) { return InErr(err, qx::Mean, x, mean); }
 
-ErrorCode CxRMS_head(CDB1D z, DBL *rms) {
-    const CDBIn in(z);
-    return qx::ArrayCxRMS(in.data(), in.size(), rms);
-}
+int32_t RMS_head(DBL1D x, DBL *rms, ErrorCode *err) { return InErr(err, qx::RMS, x, rms); }
+
+ErrorCode CxRMS_head(CDB1D z, DBL *rms) { return Returned(qx::CxRMS, z, rms); }
 
 int32_t MSE_head(DBL1D x, DBL1D y, DBL *mse, ErrorCode *err) {
-    const DBLIn first(x);
-    const DBLIn second(y);
-    return qx::Report(
-        err, qx::ArrayMSE(first.data(), first.size(), second.data(), second.size(), mse), mse);
+    return InErr(err, qx::MSE, x, y, mse);
 }
 
 int32_t Moment_head(DBL1D x, const int32_t *order, DBL *moment, ErrorCode *err) {
-    const DBLIn in(x);
-    return qx::Report(err, qx::ArrayMoment(in.data(), in.size(), *order, moment), moment);
+    return InErr(err, qx::Moment, x, *order, moment);
 }

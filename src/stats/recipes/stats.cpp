@@ -9,9 +9,9 @@ constexpr auto DBL = ElementType::DBL;
 constexpr auto CDB = ElementType::CDB;
 constexpr auto I32 = ElementType::I32;
 
-Array1DHandle Intervals(Call &c, int number) {
+HistInterval1D Intervals(Call &c, int number) {
     static const HistInterval intervals[] = {{-0.9, -0.5, 0}, {-0.5, 0.25, 1}, {0.0, 0.75, 2}};
-    return c.inRecords(number, 3, intervals, sizeof intervals);
+    return c.inRecords<HistInterval1D>(number, 3, intervals, sizeof intervals);
 }
 
 double Repeating(int32_t i) { return i % 7 - 3.0; }

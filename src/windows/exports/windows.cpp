@@ -25,20 +25,21 @@ struct SignalOf<ElementType::CDB> {
     typedef qx::ComplexSignal type;
 };
 
-template <ElementType Code, class Window>
-ErrorCode Apply(Array1DHandle x, Window window) {
-    const qx::InOut1D<Code> samples(x);
-    typedef typename SignalOf<Code>::type Signal;
+template <class Handle, class Window>
+ErrorCode Apply(Handle x, Window window) {
+    constexpr ElementType code = qx::HandleTraits<Handle>::code;
+    typedef typename SignalOf<code>::type Signal;
+    const qx::InOut1D<code> samples(x);
     return qx::Finish(window(Signal(samples.data()), samples.size()), samples);
 }
 
 template <class Window>
-ErrorCode ApplyReal(Array1DHandle x, Window window) {
-    return Apply<ElementType::DBL>(x, window);
+ErrorCode ApplyReal(DBL1D x, Window window) {
+    return Apply(x, window);
 }
 template <class Window>
-ErrorCode ApplyComplex(Array1DHandle x, Window window) {
-    return Apply<ElementType::CDB>(x, window);
+ErrorCode ApplyComplex(CDB1D x, Window window) {
+    return Apply(x, window);
 }
 
 auto Kaiser(double beta) {

@@ -1,0 +1,225 @@
+#ifndef QX_FRAME_ARRAYS_H
+#define QX_FRAME_ARRAYS_H
+
+#include "frame/elements.h"
+#include "frame/host_binding.h"
+#include "frame/outcome.h"
+#include "frame/scratch.h"
+
+#include <cstring>
+#include <limits>
+#include <type_traits>
+
+namespace qx {
+
+// Views of host arrays, named by the handle type that the declaration of an export has: In<DBL1D>,
+// Out<CDB2D>, InOut<DBL1D>. The element follows from the handle, so a view of another element does
+// not compile. They read the block through the handle at every use, so that no pointer outlives a
+// resize. Handles are never null and are not tested.
+
+// The element and the number of dimensions of a handle type.
+template <class Handle>
+struct HandleTraits;
+
+template <ElementType Code, int Dimensions>
+struct NumericHandle {
+    typedef typename Element<Code>::type T;
+    static constexpr ElementType code = Code;
+    static constexpr int dimensions = Dimensions;
+};
+template <>
+struct HandleTraits<I32_1D> : NumericHandle<ElementType::I32, 1> {};
+template <>
+struct HandleTraits<U8_1D> : NumericHandle<ElementType::U8, 1> {};
+template <>
+struct HandleTraits<U32_1D> : NumericHandle<ElementType::U32, 1> {};
+template <>
+struct HandleTraits<SGL1D> : NumericHandle<ElementType::SGL, 1> {};
+template <>
+struct HandleTraits<DBL1D> : NumericHandle<ElementType::DBL, 1> {};
+template <>
+struct HandleTraits<CSG1D> : NumericHandle<ElementType::CSG, 1> {};
+template <>
+struct HandleTraits<CDB1D> : NumericHandle<ElementType::CDB, 1> {};
+template <>
+struct HandleTraits<I32_2D> : NumericHandle<ElementType::I32, 2> {};
+template <>
+struct HandleTraits<DBL2D> : NumericHandle<ElementType::DBL, 2> {};
+template <>
+struct HandleTraits<CDB2D> : NumericHandle<ElementType::CDB, 2> {};
+
+// An input array of records: template <> struct HandleTraits<HistInterval1D>
+//     : RecordHandle<HistInterval> {};
+template <class Record>
+struct RecordHandle {
+    typedef Record T;
+    static constexpr int dimensions = 1;
+};
+
+// What a block shows, for one and for two dimensions.
+template <class Handle, int Dimensions = HandleTraits<Handle>::dimensions>
+class Block;
+
+template <class Handle>
+class Block<Handle, 1> {
+public:
+    typedef typename HandleTraits<Handle>::T T;
+
+    int32_t size() const { return (*handle_)->dimSize; }
+    bool isEmpty() const { return size() < 1; }
+
+protected:
+    typedef Array1DHandle AnyHandle;
+    explicit Block(AnyHandle handle) : handle_(handle) {}
+    T *elements() const { return reinterpret_cast<T *>(&(*handle_)[1]); }
+    std::size_t bytes() const {
+        return sizeof(Array1DBlock) + sizeof(T) * static_cast<std::size_t>(size());
+    }
+    AnyHandle handle_;
+};
+
+template <class Handle>
+class Block<Handle, 2> {
+public:
+    typedef typename HandleTraits<Handle>::T T;
+
+    int32_t rows() const { return (*handle_)->dimSizes[0]; }
+    int32_t cols() const { return (*handle_)->dimSizes[1]; }
+    bool isEmpty() const { return rows() < 1 || cols() < 1; }
+    bool isSquare() const { return rows() == cols(); }
+
+protected:
+    typedef Array2DHandle AnyHandle;
+    explicit Block(AnyHandle handle) : handle_(handle) {}
+    T *elements() const { return reinterpret_cast<T *>(&(*handle_)[1]); }
+    std::size_t bytes() const {
+        return sizeof(Array2DBlock) + sizeof(T) * static_cast<std::size_t>(rows()) *
+                                          static_cast<std::size_t>(cols());
+    }
+    AnyHandle handle_;
+};
+
+// An input.
+template <class Handle>
+class In : public Block<Handle> {
+    typedef Block<Handle> Base;
+
+public:
+    In(Handle handle) : Base(reinterpret_cast<typename Base::AnyHandle>(handle)) {}
+    const typename Base::T *data() const { return this->elements(); }
+
+    // For the frame: an input that is an output of the same call reads a copy from here on.
+    const void *identity() const { return this->handle_; }
+    ErrorCode readCopyIn(ScratchBytes &memory, void *&block) {
+        const std::size_t size = this->bytes();
+        if (const ErrorCode failed = memory.allocate(static_cast<int64_t>(size)))
+            return failed;
+        block = memory.bytes();
+        std::memcpy(block, *this->handle_, size);
+        this->handle_ = reinterpret_cast<typename Base::AnyHandle>(&block);
+        return 0;
+    }
+};
+
+// An output. EmptyCode is the element type that the host is told when the output is emptied; it
+// differs from the element's own only in the few exports that were written so. A failure empties
+// the output unless it is Kept.
+//
+// A view takes the address of the frame's own handle argument, because the host is given that
+// address and may replace the handle itself.
+enum class OnFailure { Empty, Keep };
+
+template <class Handle, OnFailure Failure = OnFailure::Empty,
+          ElementType EmptyCode = HandleTraits<Handle>::code>
+class Out : public Block<Handle> {
+    typedef Block<Handle> Base;
+    typedef typename Base::AnyHandle AnyHandle;
+    static constexpr auto code = static_cast<int32_t>(HandleTraits<Handle>::code);
+    static constexpr int dimensions = HandleTraits<Handle>::dimensions;
+
+public:
+    Out(Handle &handle)
+        : Base(reinterpret_cast<AnyHandle>(handle)), address_(reinterpret_cast<AnyHandle *>(&handle)) {}
+
+    typename Base::T *data() const { return this->elements(); }
+
+    Outcome resize(int32_t count)
+        requires(dimensions == 1)
+    {
+        const int32_t hostStatus = reshape(code, count);
+        if (hostStatus == 0)
+            (*this->handle_)->dimSize = count;
+        return Outcome::OfHost(hostStatus);
+    }
+    // The host takes the count in int32. A product that wraps there would leave a block that is
+    // smaller than its dimensions say, so it is refused as memory that cannot be had.
+    Outcome resize(int32_t rows, int32_t cols)
+        requires(dimensions == 2)
+    {
+        const int64_t count = int64_t{rows} * cols;
+        if (count > std::numeric_limits<int32_t>::max())
+            return ErrOutOfMemory;
+        const int32_t hostStatus = reshape(code, static_cast<int32_t>(count));
+        if (hostStatus == 0)
+            setSizes(rows, cols);
+        return Outcome::OfHost(hostStatus);
+    }
+
+    // The sizes become 0 even where the host refuses.
+    void empty() {
+        reshape(static_cast<int32_t>(EmptyCode), 0);
+        if constexpr (dimensions == 1)
+            (*this->handle_)->dimSize = 0;
+        else
+            setSizes(0, 0);
+    }
+    void settleFailure() {
+        if constexpr (Failure == OnFailure::Empty)
+            empty();
+    }
+
+    const void *identity() const { return this->handle_; }
+
+private:
+    int32_t reshape(int32_t typeCode, int32_t count) {
+        const int32_t hostStatus = HostBlockReshape(typeCode, dimensions, address_, count);
+        this->handle_ = *address_;
+        return hostStatus;
+    }
+    void setSizes(int32_t rows, int32_t cols) {
+        (*this->handle_)->dimSizes[0] = rows;
+        (*this->handle_)->dimSizes[1] = cols;
+    }
+    AnyHandle *address_;
+};
+
+// An array that is input and output at once: an output whose content is read first.
+template <class Handle, OnFailure Failure = OnFailure::Empty>
+using InOut = Out<Handle, Failure>;
+
+// A scalar output: a failure writes the quiet NaN, to the bit, or 0 for an integer.
+template <class T>
+class OutValue {
+public:
+    OutValue(T *address) : address_(address) {}
+    T *address() const { return address_; }
+    void operator=(const T &value) const { *address_ = value; }
+    void settleFailure() const {
+        constexpr uint64_t quietNaN = 0x7FF8000000000000;
+        if constexpr (std::is_integral_v<T>)
+            *address_ = 0;
+        else
+            for (std::size_t at = 0; at < sizeof(T); at += sizeof quietNaN)
+                std::memcpy(reinterpret_cast<char *>(address_) + at, &quietNaN, sizeof quietNaN);
+    }
+
+private:
+    T *address_;
+};
+typedef OutValue<double> OutDBL;
+typedef OutValue<int32_t> OutI32;
+typedef OutValue<CDB> OutCDB;
+
+} // namespace qx
+
+#endif
