@@ -37,12 +37,17 @@ function(qx_family)
 endfunction()
 
 # A test program: links the core (inner routines), the module (exports) and the test support, and
-# finds the data of its folder as QX_TEST_DATA "file".
+# finds a file of its tests/data by qx::test::TestData (tests/support/test_data.h).
 function(qx_test name)
-    add_executable(${name} ${ARGN})
+    # A file of its own and no definition: the tests' objects then know no path, and a compiler
+    # cache serves them for every work tree.
+    set(place ${CMAKE_CURRENT_BINARY_DIR}/${name}_data.cpp)
+    file(CONFIGURE OUTPUT ${place} CONTENT
+"#include \"tests/support/test_data.h\"
+const char *const qx::test::testDataFolder = \"${CMAKE_CURRENT_SOURCE_DIR}/tests/data/\";
+")
+    add_executable(${name} ${ARGN} ${place})
     set_target_properties(${name} PROPERTIES ENABLE_EXPORTS ON)
-    target_compile_definitions(${name} PRIVATE
-        QX_TEST_DATA="${CMAKE_CURRENT_SOURCE_DIR}/tests/data/")
     target_link_libraries(${name} PRIVATE qxanalysis qxcore qxtestsupport GTest::gtest_main)
     qx_run_as_test(${name})
 endfunction()

@@ -1,3 +1,5 @@
+#include "tests/support/test_data.h"
+
 #include <gtest/gtest.h>
 
 #include <cmath>
@@ -39,7 +41,7 @@ double ErrorInUlps(double value, double high, double low) {
 }
 
 TEST(MathLibrary, ErrorStaysBelowOneUlpOnHardAndRandomArguments) {
-    std::ifstream file(QX_TEST_DATA "reference.dat");
+    std::ifstream file(qx::test::TestData("reference.dat"));
     ASSERT_TRUE(file.is_open());
     std::map<std::string, double> worst;
     int cases = 0;

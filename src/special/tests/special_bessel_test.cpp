@@ -1,6 +1,7 @@
 #include "qx/special_bessel.h"
 
 #include "special/tests/exports.h"
+#include "tests/support/test_data.h"
 
 #include <gtest/gtest.h>
 
@@ -43,7 +44,7 @@ double Value(const char *name, double a, double b = 0, int output = 0) {
 }
 
 TEST(SpecialBessel, AgreesWithReferencesOnBothSidesOfEachThreshold) {
-    EXPECT_GT(qx::test::ExpectAgreement(Exports(), QX_TEST_DATA "bessel.dat"), 1000);
+    EXPECT_GT(qx::test::ExpectAgreement(Exports(), qx::test::TestData("bessel.dat")), 1000);
 }
 
 TEST(SpecialBessel, KeepsTheRulesOfDomainsAndLimits) {

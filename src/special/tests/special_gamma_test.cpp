@@ -1,6 +1,7 @@
 #include "qx/special_gamma.h"
 
 #include "special/tests/exports.h"
+#include "tests/support/test_data.h"
 
 #include <gtest/gtest.h>
 
@@ -35,7 +36,7 @@ double Value(const char *name, double a, double b = 0, double c = 0) {
 }
 
 TEST(SpecialGamma, AgreesWithReferencesOnBothSidesOfEachThreshold) {
-    EXPECT_GT(qx::test::ExpectAgreement(Exports(), QX_TEST_DATA "gamma.dat"), 200);
+    EXPECT_GT(qx::test::ExpectAgreement(Exports(), qx::test::TestData("gamma.dat")), 200);
 }
 
 TEST(SpecialGamma, KeepsTheRulesOfDomainsAndLimits) {

@@ -3,6 +3,7 @@
 #include "special/confluent.h"
 #include "special/hypergeometric.h"
 #include "special/tests/exports.h"
+#include "tests/support/test_data.h"
 
 #include <gtest/gtest.h>
 
@@ -30,7 +31,7 @@ double Value(const char *name, double x, double a, double b, double c = 0) {
 }
 
 TEST(SpecialHypergeometric, AgreesWithReferencesInEachForm) {
-    EXPECT_GT(qx::test::ExpectAgreement(Exports(), QX_TEST_DATA "hypergeometric.dat"), 400);
+    EXPECT_GT(qx::test::ExpectAgreement(Exports(), qx::test::TestData("hypergeometric.dat")), 400);
 }
 
 TEST(SpecialHypergeometric, KeepsTheRulesOfDomainsAndLimits) {

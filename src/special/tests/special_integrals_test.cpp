@@ -1,6 +1,7 @@
 #include "qx/special_integrals.h"
 
 #include "special/tests/exports.h"
+#include "tests/support/test_data.h"
 
 #include <gtest/gtest.h>
 
@@ -33,7 +34,7 @@ double Value(const char *name, double a, double b = 0) {
 }
 
 TEST(SpecialIntegrals, AgreesWithReferencesOnBothSidesOfEachThreshold) {
-    EXPECT_GT(qx::test::ExpectAgreement(Exports(), QX_TEST_DATA "integrals.dat"), 380);
+    EXPECT_GT(qx::test::ExpectAgreement(Exports(), qx::test::TestData("integrals.dat")), 380);
 }
 
 TEST(SpecialIntegrals, KeepsTheRulesOfDomainsAndLimits) {

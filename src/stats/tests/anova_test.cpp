@@ -1,5 +1,6 @@
 #include "qx/qx.h"
 #include "tests/support/hostile_host.h"
+#include "tests/support/test_data.h"
 
 #include <gtest/gtest.h>
 
@@ -36,7 +37,7 @@ Anova AnovaOf(const std::vector<double> &values, const std::vector<int32_t> &lab
 // The certified values of NIST. The number of digits that a single pass keeps falls with the
 // constant leading digits of the data: one in the first sets, seven in SmLs04, thirteen in SmLs07.
 TEST(Anova, ReachesTheDigitsThatASinglePassCanKeep) {
-    std::ifstream file(QX_TEST_DATA "nist_anova.dat");
+    std::ifstream file(qx::test::TestData("nist_anova.dat"));
     int sets = 0;
     for (std::string line; std::getline(file, line);) {
         if (line[0] == '#')

@@ -1,5 +1,6 @@
 #include "qx/qx.h"
 #include "stats/tests/table.h"
+#include "tests/support/test_data.h"
 
 #include <gtest/gtest.h>
 
@@ -47,7 +48,7 @@ void ExpectCode(const Outcome &outcome, ErrorCode code) {
 }
 
 TEST(Distributions, AgreeWithMultiplePrecision) {
-    const auto rows = qx::test::ReadTable(QX_TEST_DATA "distributions.dat");
+    const auto rows = qx::test::ReadTable(qx::test::TestData("distributions.dat"));
     ASSERT_GT(rows.size(), 200U);
     for (const auto &row : rows) {
         const auto &a = row.arguments;

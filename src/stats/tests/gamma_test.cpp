@@ -1,6 +1,7 @@
 #include "stats/gamma.h"
 
 #include "stats/tests/table.h"
+#include "tests/support/test_data.h"
 
 #include <gtest/gtest.h>
 
@@ -53,7 +54,7 @@ TEST(GammaFamily, AgreesWithMultiplePrecision) {
               return 6e-15 * (20 + a[0] + a[1]) * std::max(std::fabs(v), 0.1);
           }}},
     };
-    const auto rows = qx::test::ReadTable(QX_TEST_DATA "gamma.dat");
+    const auto rows = qx::test::ReadTable(qx::test::TestData("gamma.dat"));
     ASSERT_GT(rows.size(), 700U);
     for (const auto &row : rows) {
         const Function &function = functions.at(row.name);

@@ -6,6 +6,7 @@
 #include "tests/support/transform_reference.h"
 #include "transforms/dct.h"
 #include "transforms/dst.h"
+#include "tests/support/test_data.h"
 
 #include <gtest/gtest.h>
 
@@ -174,7 +175,7 @@ TEST(DCTDST, TwoDimensionsByDefinitionCroppedAndPadded) {
 }
 
 TEST(DCTDST, AgreeWithSciPy) {
-    std::ifstream file(QX_TEST_DATA "dct_dst.dat");
+    std::ifstream file(qx::test::TestData("dct_dst.dat"));
     std::string line;
     int lines = 0;
     for (; std::getline(file, line); ++lines) {

@@ -1,6 +1,7 @@
 #include "qx/qx.h"
 #include "tests/support/hostile_host.h"
 #include "tests/support/recipe.h"
+#include "tests/support/test_data.h"
 
 #include <gtest/gtest.h>
 
@@ -37,7 +38,7 @@ struct Row {
 };
 
 std::vector<Row> ReferenceRows() {
-    std::ifstream file(QX_TEST_DATA "windows.dat");
+    std::ifstream file(qx::test::TestData("windows.dat"));
     std::vector<Row> rows;
     for (std::string line; std::getline(file, line);) {
         std::istringstream words(line);
