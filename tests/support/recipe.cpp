@@ -2,7 +2,10 @@
 
 #include "tests/support/heap_probe.h"
 
+#include <algorithm>
 #include <cstring>
+#include <sstream>
+#include <stdexcept>
 
 namespace qx::test {
 
@@ -41,25 +44,52 @@ void AddBytes(Hash &hash, const unsigned char *bytes, std::size_t count) {
 
 } // namespace
 
-void Call::remember(Array &array) {
-    array.before.assign(array.block(), array.block() + array.blockSize());
+bool Call::Array::isUnchanged() const {
+    return blockSize() == before.size() && std::memcmp(block(), before.data(), before.size()) == 0;
+}
+
+bool Call::Array::isEmpty() const {
+    const std::vector<int32_t> all = sizes();
+    return std::all_of(all.begin(), all.end(), [](int32_t size) { return size == 0; });
+}
+
+int32_t Call::sizeOf(int number, int dimension, int32_t asked) const {
+    const bool isAltered = number == altered_.input && dimension == altered_.dimension;
+    return isAltered ? altered_.size : asked;
+}
+
+void Call::addInput(Role role, int number, std::unique_ptr<Array> array) {
+    array->role = role;
+    array->before.assign(array->block(), array->block() + array->blockSize());
+    if (!inputs_.emplace(number, std::move(array)).second)
+        throw std::logic_error("a recipe with two inputs of number " + std::to_string(number));
 }
 
 void *Call::makeRecords(int number, int32_t count, const void *records, std::size_t bytes) {
     const HeapProbe::Pause pause;
-    const int32_t stored = countOf(number, count);
-    auto array = std::make_unique<Array1<ElementType::U8>>(static_cast<int32_t>(bytes));
-    std::memcpy(array->array.data(), records, bytes);
+    // The block is as long as the bytes of its records; its size field counts the records.
+    const int32_t stored = sizeOf(number, 0, count);
+    const std::size_t each = bytes / static_cast<std::size_t>(count);
+    auto array = std::make_unique<Array1<ElementType::U8>>(
+        static_cast<int32_t>(each * static_cast<std::size_t>(stored)));
+    for (int32_t i = 0; i < stored; ++i)
+        std::memcpy(array->array.data() + each * static_cast<std::size_t>(i),
+                    static_cast<const char *>(records) + each * static_cast<std::size_t>(i % count),
+                    each);
     const U8_1D handle = array->array.handle();
-    (*handle)->dimSize = stored; // of records; the block is as long as their bytes
-    remember(*array);
-    inputs_[number] = std::move(array);
+    (*handle)->dimSize = stored;
+    addInput(Role::Input, number, std::move(array));
     return handle;
 }
 
 double *Call::scalar(int number) {
     const HeapProbe::Pause pause;
     return &(scalars_[number] = 12345.0);
+}
+
+CDB *Call::complexScalar(int number) {
+    const HeapProbe::Pause pause;
+    return &(complexScalars_[number] = {12345.0, -12345.0});
 }
 
 int32_t *Call::integer(int number) {
@@ -91,38 +121,63 @@ ErrorCode *Call::err() {
 
 ErrorCode Call::status(int32_t functionResult) const { return hasError_ ? error_ : functionResult; }
 
-bool Call::inputsAreUnchanged() const {
-    for (const auto &[number, array] : inputs_)
-        if (array->blockSize() != array->before.size() ||
-            std::memcmp(array->block(), array->before.data(), array->before.size()) != 0)
-            return false;
-    return true;
+std::vector<Call::Size> Call::inputSizes() const {
+    std::vector<Size> found;
+    for (const auto &[number, array] : inputs_) {
+        const bool mayBeZero =
+            std::find(mayBeEmpty_.begin(), mayBeEmpty_.end(), number) != mayBeEmpty_.end();
+        // The sizes at the start; an export may have changed them since.
+        for (std::size_t i = 0; i < array->sizes().size(); ++i) {
+            int32_t size;
+            std::memcpy(&size, array->before.data() + 4 * i, sizeof size);
+            found.push_back({number, static_cast<int>(i), size, mayBeZero});
+        }
+    }
+    return found;
 }
 
-bool Call::outputsAreEmpty() const {
-    for (const Arrays *arrays : {&inOuts_, &outputs_})
-        for (const auto &[number, array] : *arrays)
-            if (array->elementCount() != 0)
+bool Call::inputsAreUnchanged() const {
+    return std::all_of(inputs_.begin(), inputs_.end(), [](const auto &input) {
+        return input.second->role != Role::Input || input.second->isUnchanged();
+    });
+}
+
+bool Call::outputsAreSettled() const {
+    for (const Arrays *arrays : {&inputs_, &outputs_})
+        for (const auto &[number, array] : *arrays) {
+            const bool mustBeEmpty = array->role == Role::InOut || array->role == Role::Output;
+            if ((mustBeEmpty && !array->isEmpty()) ||
+                (array->role == Role::Kept && !array->isUnchanged()))
                 return false;
-    for (const auto &[number, value] : scalars_) {
-        constexpr uint64_t quietNaN = 0x7FF8000000000000;
-        if (std::memcmp(&value, &quietNaN, sizeof value) != 0)
+        }
+    constexpr uint64_t quietNaN[2] = {0x7FF8000000000000, 0x7FF8000000000000};
+    for (const auto &[number, value] : scalars_)
+        if (std::memcmp(&value, quietNaN, sizeof value) != 0)
             return false;
-    }
-    return true;
+    for (const auto &[number, value] : complexScalars_)
+        if (std::memcmp(&value, quietNaN, sizeof value) != 0)
+            return false;
+    return std::all_of(integers_.begin(), integers_.end(),
+                       [](const auto &integer) { return integer.second == 0; });
 }
 
 uint64_t Call::outputHash(ErrorCode status) const {
     Hash hash;
     hash.add(&status, sizeof status);
-    for (const Arrays *arrays : {&spoiled_, &inOuts_, &outputs_})
+    for (const Arrays *arrays : {&inputs_, &outputs_})
         for (const auto &[number, array] : *arrays) {
-            const std::size_t header = array->blockSize() % 8 == 4 ? 4 : 8;
+            if (array->role == Role::Input)
+                continue;
+            const std::size_t header = array->headerSize();
             hash.add(array->block(), header);
             AddBytes(hash, array->block() + header, array->blockSize() - header);
         }
     for (const auto &[number, value] : scalars_)
         hash.add(value);
+    for (const auto &[number, value] : complexScalars_) {
+        hash.add(value.re);
+        hash.add(value.im);
+    }
     for (const auto &[number, value] : integers_)
         hash.add(&value, sizeof value);
     for (const auto &[number, bytes] : records_)
@@ -131,14 +186,21 @@ uint64_t Call::outputHash(ErrorCode status) const {
 }
 
 std::string Call::describeOutputs() const {
-    std::string text;
-    for (const Arrays *arrays : {&inOuts_, &outputs_})
-        for (const auto &[number, array] : *arrays)
-            text +=
-                " array " + std::to_string(number) + " of " + std::to_string(array->elementCount());
+    std::ostringstream text;
+    for (const Arrays *arrays : {&inputs_, &outputs_})
+        for (const auto &[number, array] : *arrays) {
+            text << (arrays == &inputs_ ? " input " : " output ") << number
+                 << (array->isUnchanged() ? " (unchanged) of" : " of");
+            for (const int32_t size : array->sizes())
+                text << ' ' << size;
+        }
     for (const auto &[number, value] : scalars_)
-        text += " scalar " + std::to_string(number) + " = " + std::to_string(value);
-    return text;
+        text << " scalar " << number << " = " << value;
+    for (const auto &[number, value] : complexScalars_)
+        text << " complex scalar " << number << " = " << value.re << ", " << value.im;
+    for (const auto &[number, value] : integers_)
+        text << " integer " << number << " = " << value;
+    return text.str();
 }
 
 void Call::releaseNodes() {

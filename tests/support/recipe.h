@@ -13,16 +13,31 @@
 #include <vector>
 
 // One line per export that says how it is called with valid arguments. From these lines the
-// conformance tests drive every export through failing resizes and allocations, empty inputs,
-// the workspace, moving blocks and several threads, and the bit hashes are made.
+// conformance tests drive every export through failing resizes and allocations, empty and
+// mismatched inputs, the workspace, moving blocks and several threads, and the bit hashes are made.
 //
 //   {"ReOXFFTH80", [](Call &c) {
 //        return ReOXFFTH80(c.in<DBL>(0), c.out<CDB>(0), c.slot(0), 1, c.n, 0);
 //    }},
 //   {"Mean_head", [](Call &c) { return Mean_head(c.in<DBL>(0), c.scalar(0), c.err()); }},
 //
-// Arguments carry a number each, inputs and outputs counted apart, because C++ leaves open in
-// which order arguments are evaluated, and the content follows the number.
+// An export whose selectors, matrix types or methods matter has several: after the name of the
+// export and ": " comes what the recipe shows, and a loop may write them.
+//
+//   {"Norm_head: of infinity", [](Call &c) { ... }},
+//   for (int32_t type = 0; type < 4; ++type)
+//       recipes.push_back({"Det_head: type " + std::to_string(type), [type](Call &c) { ... }});
+//
+// Arguments carry a number each, because C++ leaves open in which order arguments are evaluated,
+// and the content follows the number. Inputs (also those that are outputs as well) are counted in
+// one row, outputs in another:
+//
+//   {"SolveInPlace", [](Call &c) {
+//        return SolveInPlace(c.in2D<DBL>(0, c.n, c.n, Dominant), c.inOut<DBL>(1), c.integer(0));
+//    }},
+//
+// Content is noise in [-1, 1), for integers noise in [-9, 9], for masks 0 and 1; or what a function
+// of the index gives, or for a matrix one of row and column, as double or CDB.
 
 namespace qx::test {
 
@@ -46,6 +61,9 @@ private:
     uint64_t state_;
 };
 
+// The content of an array that no function is given for.
+struct FromNoise {};
+
 // One call of one export: makes the arguments, keeps the outputs.
 class Call {
 public:
@@ -55,15 +73,19 @@ public:
 
     const int32_t n; // the size that the recipe builds its arguments from
 
-    // Input arrays, read only: noise in [-1, 1), or what `value(i)` gives.
+    // Input arrays, read only.
     template <ElementType Code>
     Handle1D<Code> in(int number) {
         return in<Code>(number, n);
     }
-    template <ElementType Code>
-    Handle1D<Code> in(int number, int32_t count, double (*value)(int32_t) = nullptr);
-    template <ElementType Code>
-    Handle2D<Code> in2D(int number, int32_t rows, int32_t cols, double (*value)(int32_t) = nullptr);
+    template <ElementType Code, class Values = FromNoise>
+    Handle1D<Code> in(int number, int32_t count, const Values &values = {}) {
+        return make<Code>(Role::Input, number, count, values);
+    }
+    template <ElementType Code, class Values = FromNoise>
+    Handle2D<Code> in2D(int number, int32_t rows, int32_t cols, const Values &values = {}) {
+        return make<Code>(Role::Input, number, rows, cols, values);
+    }
     // A 1-D block of records, `bytes` in all.
     // Named by the handle type: c.inRecords<HistInterval1D>(1, 3, intervals, sizeof intervals).
     template <class Handle>
@@ -76,24 +98,50 @@ public:
     Handle1D<Code> out(int number);
     template <ElementType Code>
     Handle2D<Code> out2D(int number);
-    // Arrays that are input and output at once: a failure empties them, too, unless the export
-    // promises otherwise.
+
+    // Arrays that are input and output at once: a failure empties them, too.
     template <ElementType Code>
     Handle1D<Code> inOut(int number) {
         return inOut<Code>(number, n);
     }
-    template <ElementType Code>
-    Handle1D<Code> inOut(int number, int32_t count, double (*value)(int32_t) = nullptr);
-    // An input that the export is known to write into; its content afterwards is an output.
+    template <ElementType Code, class Values = FromNoise>
+    Handle1D<Code> inOut(int number, int32_t count, const Values &values = {}) {
+        return make<Code>(Role::InOut, number, count, values);
+    }
+    template <ElementType Code, class Values = FromNoise>
+    Handle2D<Code> inOut2D(int number, int32_t rows, int32_t cols, const Values &values = {}) {
+        return make<Code>(Role::InOut, number, rows, cols, values);
+    }
+    // The same, but a failure leaves them as they were: the state of a stream.
+    template <ElementType Code, class Values = FromNoise>
+    Handle1D<Code> kept(int number, int32_t count, const Values &values = {}) {
+        return make<Code>(Role::Kept, number, count, values);
+    }
+    template <ElementType Code, class Values = FromNoise>
+    Handle2D<Code> kept2D(int number, int32_t rows, int32_t cols, const Values &values = {}) {
+        return make<Code>(Role::Kept, number, rows, cols, values);
+    }
+    // The same without a rule on failure: an input that the export is known to write into.
     template <ElementType Code>
     Handle1D<Code> spoiled(int number) {
         return spoiled<Code>(number, n);
     }
-    template <ElementType Code>
-    Handle1D<Code> spoiled(int number, int32_t count, double (*value)(int32_t) = nullptr);
+    template <ElementType Code, class Values = FromNoise>
+    Handle1D<Code> spoiled(int number, int32_t count, const Values &values = {}) {
+        return make<Code>(Role::Spoiled, number, count, values);
+    }
+    template <ElementType Code, class Values = FromNoise>
+    Handle2D<Code> spoiled2D(int number, int32_t rows, int32_t cols, const Values &values = {}) {
+        return make<Code>(Role::Spoiled, number, rows, cols, values);
+    }
 
-    // Scalar outputs: a failure leaves the quiet NaN, or for integers 0.
+    // An input that may be empty without a failure (quirk TakesEmptyInput: all of them).
+    void mayBeEmpty(int number) { mayBeEmpty_.push_back(number); }
+
+    // Scalar outputs: a failure leaves the quiet NaN, in both parts of a complex one, or for
+    // integers 0.
     double *scalar(int number);
+    CDB *complexScalar(int number);
     int32_t *integer(int number);
     // A record or a pair that is an output but follows no rule on failure.
     template <class Record>
@@ -118,23 +166,37 @@ public:
         return &instance_;
     }
 
-    // What the engine asks.
+    // What the engine asks. `alter` changes one size of one input before the call is made.
     ErrorCode status(int32_t functionResult) const;
-    int inputCount() const { return static_cast<int>(inputs_.size() + inOuts_.size()); }
-    void makeEmpty(int input) { emptyInput_ = input; } // the n-th input array that is asked for
+    bool hasErr() const { return hasError_; }
+    struct Size {
+        int input;
+        int dimension;
+        int32_t value;
+        bool mayBeZero;
+    };
+    std::vector<Size> inputSizes() const;
+    void alter(int input, int dimension, int32_t size) { altered_ = {input, dimension, size}; }
     bool inputsAreUnchanged() const;
-    bool outputsAreEmpty() const; // arrays without elements, scalars NaN
+    // After a failure: arrays without elements, scalars NaN or 0, kept arrays as they were.
+    bool outputsAreSettled() const;
     uint64_t outputHash(ErrorCode status) const;
     std::string describeOutputs() const;
     void releaseNodes();
     ~Call() { releaseNodes(); }
 
 private:
+    enum class Role { Input, InOut, Kept, Spoiled, Output };
     struct Array {
         virtual ~Array() = default;
         virtual const unsigned char *block() const = 0; // sizes and elements
         virtual std::size_t blockSize() const = 0;
-        virtual int32_t elementCount() const = 0;
+        virtual std::vector<int32_t> sizes() const = 0;
+        bool isUnchanged() const;
+        bool isEmpty() const; // all its sizes are 0
+        std::size_t headerSize() const { return 4 * sizes().size(); }
+
+        Role role = Role::Output;
         std::vector<unsigned char> before; // content at the start, for inputs
     };
     template <ElementType Code>
@@ -142,15 +204,23 @@ private:
     template <ElementType Code>
     struct Array2;
     typedef std::map<int, std::unique_ptr<Array>> Arrays;
+    struct Alteration {
+        int input;
+        int dimension;
+        int32_t size;
+    };
 
-    template <ElementType Code>
-    Handle1D<Code> make(Arrays &arrays, int number, int32_t count, double (*value)(int32_t));
+    template <ElementType Code, class Values>
+    Handle1D<Code> make(Role role, int number, int32_t count, const Values &values);
+    template <ElementType Code, class Values>
+    Handle2D<Code> make(Role role, int number, int32_t rows, int32_t cols, const Values &values);
     void *makeRecords(int number, int32_t count, const void *records, std::size_t bytes);
-    int32_t countOf(int number, int32_t count) { return number == emptyInput_ ? 0 : count; }
-    static void remember(Array &array);
+    int32_t sizeOf(int number, int dimension, int32_t asked) const;
+    void addInput(Role role, int number, std::unique_ptr<Array> array);
 
-    Arrays inputs_, inOuts_, spoiled_, outputs_;
+    Arrays inputs_, outputs_;
     std::map<int, double> scalars_;
+    std::map<int, CDB> complexScalars_;
     std::map<int, int32_t> integers_;
     std::map<int, std::vector<unsigned char>> records_;
     std::map<int, void *> slots_;
@@ -158,17 +228,18 @@ private:
     int32_t (*releaseInstance_)(void **) = nullptr;
     std::vector<std::unique_ptr<int32_t>> int32Values_;
     std::vector<std::unique_ptr<double>> doubleValues_;
+    std::vector<int> mayBeEmpty_;
     ErrorCode error_ = 0;
     bool hasError_ = false;
-    int emptyInput_ = -1;
+    Alteration altered_ = {-1, 0, 0};
 };
 
 // What an export is known to do differently; everything else is checked.
 enum Quirk : unsigned {
     None = 0,
-    // Codes other than failure for an empty input array.
+    // Codes other than failure for empty input arrays; for some of them only: Call::mayBeEmpty.
     TakesEmptyInput = 1,
-    // A refused resize comes back as the host's own status.
+    // A refused resize comes back as the host's own status, untranslated.
     HostStatusPassesThrough = 2,
     // Heap calls beside the scratch front (plans, work blocks, instance data).
     UsesHeap = 4,
@@ -180,13 +251,20 @@ enum Quirk : unsigned {
     NoStatus = 32,
     // Goes through BLAS or LAPACK, whose kernels differ between processors.
     BitsMayDiffer = 64,
+    // The code stands in *err, and the function result is the host's own status where the host
+    // refused a resize (else 0, as for all others with an error out-parameter).
+    HostStatusInResult = 128,
+    // The code stands in *err and is the function result as well.
+    CodeInBoth = 256,
 };
 
 struct Recipe {
-    const char *name;
+    std::string name; // of the export, or "export: variant"
     std::function<int32_t(Call &)> run;
     unsigned quirks = None;
     std::vector<int32_t> sizes = {1, 2, 3, 8, 50, 1000};
+
+    std::string exportName() const { return name.substr(0, name.find(':')); }
 };
 
 inline void PrintTo(const Recipe &recipe, std::ostream *stream) { *stream << recipe.name; }

@@ -3,6 +3,8 @@
 
 #include "tests/support/heap_probe.h"
 
+#include <type_traits>
+
 // The templates of Call; included by recipe.h.
 
 namespace qx::test {
@@ -15,17 +17,43 @@ inline void Set(I32 *element, double value) { *element = static_cast<int32_t>(va
 inline void Set(U32 *element, double value) { *element = static_cast<uint32_t>(value); }
 inline void Set(U8 *element, double value) { *element = static_cast<uint8_t>(value); }
 
-template <class T>
-void Fill(T *elements, std::ptrdiff_t count, int seed, double (*value)(int32_t)) {
+// What noise is to each element: whole numbers need a wider range to say anything.
+inline double NoiseFor(const SGL *, Noise &noise) { return noise.symmetric(); }
+inline double NoiseFor(const DBL *, Noise &noise) { return noise.symmetric(); }
+inline double NoiseFor(const I32 *, Noise &noise) { return noise.symmetric() * 10; }
+inline double NoiseFor(const U32 *, Noise &noise) { return noise.bits(); }
+inline double NoiseFor(const U8 *, Noise &noise) { return noise.bits() % 2; }
+
+template <class Values>
+auto ValueAt(const Values &values, int32_t index, int32_t cols) {
+    if constexpr (std::is_invocable_v<Values, int32_t, int32_t>)
+        return values(index / cols, index % cols);
+    else
+        return values(index);
+}
+
+template <class T, class Values>
+void Fill(T *elements, int32_t count, int32_t cols, int seed, const Values &values) {
     constexpr bool isComplex = requires { elements->re; };
+    constexpr bool isNoise = std::is_same_v<Values, FromNoise>;
     Noise noise(static_cast<uint64_t>(seed));
-    for (std::ptrdiff_t i = 0; i < count; ++i) {
-        const double first = value != nullptr ? value(static_cast<int32_t>(i)) : noise.symmetric();
-        if constexpr (isComplex) {
-            Set(&elements[i].re, first);
+    for (int32_t i = 0; i < count; ++i) {
+        if constexpr (isNoise && isComplex) {
+            Set(&elements[i].re, noise.symmetric());
             Set(&elements[i].im, noise.symmetric());
+        } else if constexpr (isNoise) {
+            Set(&elements[i], NoiseFor(&elements[i], noise));
         } else {
-            Set(&elements[i], first);
+            const auto value = ValueAt(values, i, cols);
+            if constexpr (!isComplex) {
+                Set(&elements[i], value);
+            } else if constexpr (requires { value.re; }) {
+                Set(&elements[i].re, value.re);
+                Set(&elements[i].im, value.im);
+            } else {
+                Set(&elements[i].re, value);
+                Set(&elements[i].im, noise.symmetric());
+            }
         }
     }
 }
@@ -42,7 +70,7 @@ struct Call::Array1 : Call::Array {
     std::size_t blockSize() const override {
         return 4 + static_cast<std::size_t>(array.size()) * sizeof(typename Element<Code>::type);
     }
-    int32_t elementCount() const override { return array.size(); }
+    std::vector<int32_t> sizes() const override { return {array.size()}; }
 };
 
 template <ElementType Code>
@@ -55,35 +83,26 @@ struct Call::Array2 : Call::Array {
     std::size_t blockSize() const override {
         return 8 + static_cast<std::size_t>(array.size()) * sizeof(typename Element<Code>::type);
     }
-    int32_t elementCount() const override {
-        return array.rows() == 0 && array.cols() == 0 ? 0 : array.size() + 1;
-    }
+    std::vector<int32_t> sizes() const override { return {array.rows(), array.cols()}; }
 };
 
-template <ElementType Code>
-Handle1D<Code> Call::make(Arrays &arrays, int number, int32_t count, double (*value)(int32_t)) {
+template <ElementType Code, class Values>
+Handle1D<Code> Call::make(Role role, int number, int32_t count, const Values &values) {
     const HeapProbe::Pause pause;
-    auto array = std::make_unique<Array1<Code>>(countOf(number, count));
-    detail::Fill(array->array.data(), array->array.size(), number, value);
-    remember(*array);
+    auto array = std::make_unique<Array1<Code>>(sizeOf(number, 0, count));
+    detail::Fill(array->array.data(), array->array.size(), 1, number, values);
     const Handle1D<Code> handle = array->array.handle();
-    arrays[number] = std::move(array);
+    addInput(role, number, std::move(array));
     return handle;
 }
 
-template <ElementType Code>
-Handle1D<Code> Call::in(int number, int32_t count, double (*value)(int32_t)) {
-    return make<Code>(inputs_, number, count, value);
-}
-
-template <ElementType Code>
-Handle2D<Code> Call::in2D(int number, int32_t rows, int32_t cols, double (*value)(int32_t)) {
+template <ElementType Code, class Values>
+Handle2D<Code> Call::make(Role role, int number, int32_t rows, int32_t cols, const Values &values) {
     const HeapProbe::Pause pause;
-    auto array = std::make_unique<Array2<Code>>(countOf(number, rows), countOf(number, cols));
-    detail::Fill(array->array.data(), array->array.size(), number, value);
-    remember(*array);
+    auto array = std::make_unique<Array2<Code>>(sizeOf(number, 0, rows), sizeOf(number, 1, cols));
+    detail::Fill(array->array.data(), array->array.size(), array->array.cols(), number, values);
     const Handle2D<Code> handle = array->array.handle();
-    inputs_[number] = std::move(array);
+    addInput(role, number, std::move(array));
     return handle;
 }
 
@@ -103,16 +122,6 @@ Handle2D<Code> Call::out2D(int number) {
     const Handle2D<Code> handle = array->array.handle();
     outputs_[number] = std::move(array);
     return handle;
-}
-
-template <ElementType Code>
-Handle1D<Code> Call::inOut(int number, int32_t count, double (*value)(int32_t)) {
-    return make<Code>(inOuts_, number, count, value);
-}
-
-template <ElementType Code>
-Handle1D<Code> Call::spoiled(int number, int32_t count, double (*value)(int32_t)) {
-    return make<Code>(spoiled_, number, count, value);
 }
 
 } // namespace qx::test

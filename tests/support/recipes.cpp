@@ -1,7 +1,6 @@
 #include "tests/support/recipe.h"
 
 #include <algorithm>
-#include <cstring>
 
 namespace qx::test {
 
@@ -31,9 +30,8 @@ const std::vector<Recipe> &AllRecipes() {
             for (Recipe &recipe : make())
                 recipes.push_back(std::move(recipe));
         // The order of the files is the linker's.
-        std::stable_sort(recipes.begin(), recipes.end(), [](const Recipe &a, const Recipe &b) {
-            return std::strcmp(a.name, b.name) < 0;
-        });
+        std::stable_sort(recipes.begin(), recipes.end(),
+                         [](const Recipe &a, const Recipe &b) { return a.name < b.name; });
         return recipes;
     }();
     return all;
@@ -44,7 +42,7 @@ const std::vector<Exempt> &ExemptExports() { return Registered().exempt; }
 std::map<std::string, ExportHash> HashEveryExport(const Caller &caller) {
     std::map<std::string, ExportHash> hashes;
     for (const Recipe &recipe : AllRecipes()) {
-        ExportHash &found = hashes[recipe.name];
+        ExportHash &found = hashes[recipe.exportName()];
         found.mayDiffer |= (recipe.quirks & BitsMayDiffer) != 0;
         for (const int32_t n : recipe.sizes) {
             Call call(n);

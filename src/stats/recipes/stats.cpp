@@ -31,7 +31,8 @@ std::vector<Recipe> BasicStatisticsRecipes() {
          [](Call &c) {
              return histgran_head(c.in<DBL>(0), c.byReference(10), c.out<I32>(0), c.out<DBL>(1),
                                   c.err());
-         }},
+         },
+         HostStatusInResult},
         {"GenHistH",
          [](Call &c) {
              return GenHistH(c.in<DBL>(0), Intervals(c, 1), c.out<I32>(0), c.record<HistSummary>(0),
