@@ -1,7 +1,9 @@
+// The choice of width: a routine of the width in use against a direct call of the baseline's.
 // Scratch memory from the enabled workspace against malloc and free of the same sizes: request
 // and release in turn, and runs of eight requests released newest first, by one thread and four.
 
 #include "bench/timing.h"
+#include "fft/kernels/kernels.h"
 #include "frame/scratch.h"
 #include "frame/workspace.h"
 
@@ -97,9 +99,27 @@ void Compare(int threads, Ratios &all) {
     }
 }
 
+// The same routine both times, so the difference is what the choice costs.
+void CompareCalls() {
+    constexpr int calls = 1000;
+    static volatile int32_t length = 5;
+    const auto times = MedianTimes(
+        [] {
+            for (int i = 0; i < calls; ++i)
+                Keep(qx::WholeKernelsOf(length));
+        },
+        [] {
+            for (int i = 0; i < calls; ++i)
+                Keep(qx::baseline::WholeKernelsOf(length));
+        });
+    std::printf("call by width %.2f ns, direct call %.2f ns\n", times[0] / calls * 1e9,
+                times[1] / calls * 1e9);
+}
+
 } // namespace
 
 int main() {
+    CompareCalls();
     if (qx::analysisWorkspace.reserve(1U << 30) != 0 || qx::analysisWorkspace.setEnabled(true) != 0)
         return 1;
     if (!qx::analysisWorkspace.isEnabled())

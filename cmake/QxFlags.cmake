@@ -16,11 +16,6 @@ endforeach()
 if(CMAKE_SIZEOF_VOID_P EQUAL 4)
     target_compile_options(qxflags INTERFACE -msse2 -mfpmath=sse -mstackrealign)
 endif()
-if(NOT QX_ARCH STREQUAL "baseline")
-    # The compiler's vectoriser fuses a multiplication with an alternating addition whatever
-    # -ffp-contract says (g++ 12), so it must not find such instructions. AVX-512 has its own.
-    target_compile_options(qxflags INTERFACE -march=${QX_ARCH} -mno-fma -mno-avx512f)
-endif()
 if(QX_SANITIZE)
     target_compile_options(qxflags INTERFACE -fsanitize=${QX_SANITIZE} -fno-omit-frame-pointer
         -fno-sanitize-recover=all)

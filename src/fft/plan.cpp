@@ -176,7 +176,7 @@ bool BuildRader(FFTStage *stage, int32_t p) {
 bool BuildStage(FFTStage *stage, int32_t p, int32_t kind, int32_t n) {
     const bool isLeaf = n == p;
     if (kind == KernelFactor)
-        stage->kernels = &KernelsOf(p);
+        stage->kernels = KernelsOf(p);
     return (isLeaf || BuildTwiddles(stage, p, n)) &&
            (isLeaf || kind != KernelFactor || BuildLanes(stage, p, n / p)) &&
            (kind != DirectPrime || BuildRoots(stage, p)) &&
@@ -199,13 +199,13 @@ void FillKernels(FFTPlan *plan) {
     for (int32_t s = 0; s < plan->factorCount; ++s) {
         if (plan->kinds[s] != KernelFactor)
             continue;
-        const KernelSet &kernels = KernelsOf(plan->factors[s]);
-        plan->realLeaf[s] = kernels.realLeaf;
-        plan->realTwiddle[s] = kernels.realTwiddle;
-        plan->complexLeaf[s] = kernels.complexLeaf;
-        plan->complexTwiddle[s] = kernels.complexTwiddle;
+        const KernelSet *const kernels = KernelsOf(plan->factors[s]);
+        plan->realLeaf[s] = kernels->realLeaf;
+        plan->realTwiddle[s] = kernels->realTwiddle;
+        plan->complexLeaf[s] = kernels->complexLeaf;
+        plan->complexTwiddle[s] = kernels->complexTwiddle;
         if (plan->factorCount == 1)
-            plan->whole = &kernels;
+            plan->whole = kernels;
     }
     if (plan->factorCount > 1)
         plan->whole = WholeKernelsOf(plan->length);

@@ -1,10 +1,14 @@
 #ifndef QX_FRAME_LANES_H
 #define QX_FRAME_LANES_H
 
+#include "frame/widths.h"
 #include "qx/types.h"
 
 #include <cstddef>
 #include <cstring>
+
+// Operations become part of the loop that uses them, at every level of optimisation.
+#define QX_INLINE __attribute__((always_inline)) inline
 
 namespace qx {
 
@@ -20,11 +24,14 @@ namespace qx {
 //
 // Memory need not be aligned. N is 1, 2 or 4.
 
-// What the instruction set of the build offers.
-#ifdef __AVX__
-inline constexpr int nativeLanes = 4;
+// What the instruction set of the build offers. Each build has its own of all that follows, so that
+// none of it can stand in for that of another.
+#ifdef __AVX2__
+inline namespace lanes4 {
+constexpr int nativeLanes = 4;
 #else
-inline constexpr int nativeLanes = 2;
+inline namespace lanes2 {
+constexpr int nativeLanes = 2;
 #endif
 
 template <int N>
@@ -32,12 +39,12 @@ struct LaneVector;
 template <>
 struct LaneVector<2> {
     typedef double type __attribute__((vector_size(16)));
-    static type broadcast(double x) { return type{x, x}; }
+    static QX_INLINE type broadcast(double x) { return type{x, x}; }
 };
 template <>
 struct LaneVector<4> {
     typedef double type __attribute__((vector_size(32)));
-    static type broadcast(double x) { return type{x, x, x, x}; }
+    static QX_INLINE type broadcast(double x) { return type{x, x, x, x}; }
 };
 
 template <int N>
@@ -46,45 +53,45 @@ public:
     typedef typename LaneVector<N>::type Vector;
     static constexpr int count = N;
 
-    Lanes() = default;
+    QX_INLINE Lanes() = default;
     // The same value in every lane.
-    explicit Lanes(double value) : v(LaneVector<N>::broadcast(value)) {}
-    explicit Lanes(Vector vector) : v(vector) {}
+    QX_INLINE explicit Lanes(double value) : v(LaneVector<N>::broadcast(value)) {}
+    QX_INLINE explicit Lanes(Vector vector) : v(vector) {}
 
-    static Lanes load(const DBL *x) {
+    static QX_INLINE Lanes load(const DBL *x) {
         Lanes lanes;
         std::memcpy(&lanes.v, x, sizeof lanes.v);
         return lanes;
     }
-    void store(DBL *x) const { std::memcpy(x, &v, sizeof v); }
+    QX_INLINE void store(DBL *x) const { std::memcpy(x, &v, sizeof v); }
 
     // Elements 0, stride, 2 stride, ...
-    static Lanes gather(const DBL *x, std::ptrdiff_t stride) {
+    static QX_INLINE Lanes gather(const DBL *x, std::ptrdiff_t stride) {
         if constexpr (N == 2)
             return Lanes(Vector{x[0], x[stride]});
         else
             return Lanes(Vector{x[0], x[stride], x[2 * stride], x[3 * stride]});
     }
-    void scatter(DBL *x, std::ptrdiff_t stride) const {
+    QX_INLINE void scatter(DBL *x, std::ptrdiff_t stride) const {
         for (int i = 0; i < N; ++i)
             x[i * stride] = v[i];
     }
 
     // The lanes in the opposite order.
-    Lanes reversed() const {
+    QX_INLINE Lanes reversed() const {
         if constexpr (N == 2)
             return Lanes(__builtin_shufflevector(v, v, 1, 0));
         else
             return Lanes(__builtin_shufflevector(v, v, 3, 2, 1, 0));
     }
 
-    double operator[](int lane) const { return v[lane]; }
+    QX_INLINE double operator[](int lane) const { return v[lane]; }
 
-    friend Lanes operator+(Lanes a, Lanes b) { return Lanes(a.v + b.v); }
-    friend Lanes operator-(Lanes a, Lanes b) { return Lanes(a.v - b.v); }
-    friend Lanes operator*(Lanes a, Lanes b) { return Lanes(a.v * b.v); }
-    friend Lanes operator/(Lanes a, Lanes b) { return Lanes(a.v / b.v); }
-    friend Lanes operator-(Lanes a) { return Lanes(-a.v); }
+    friend QX_INLINE Lanes operator+(Lanes a, Lanes b) { return Lanes(a.v + b.v); }
+    friend QX_INLINE Lanes operator-(Lanes a, Lanes b) { return Lanes(a.v - b.v); }
+    friend QX_INLINE Lanes operator*(Lanes a, Lanes b) { return Lanes(a.v * b.v); }
+    friend QX_INLINE Lanes operator/(Lanes a, Lanes b) { return Lanes(a.v / b.v); }
+    friend QX_INLINE Lanes operator-(Lanes a) { return Lanes(-a.v); }
 
     Vector v;
 };
@@ -94,25 +101,26 @@ class Lanes<1> {
 public:
     static constexpr int count = 1;
 
-    Lanes() = default;
-    explicit Lanes(double value) : v(value) {}
+    QX_INLINE Lanes() = default;
+    QX_INLINE explicit Lanes(double value) : v(value) {}
 
-    static Lanes load(const DBL *x) { return Lanes(*x); }
-    void store(DBL *x) const { *x = v; }
-    static Lanes gather(const DBL *x, std::ptrdiff_t) { return Lanes(*x); }
-    void scatter(DBL *x, std::ptrdiff_t) const { *x = v; }
-    Lanes reversed() const { return *this; }
-    double operator[](int) const { return v; }
+    static QX_INLINE Lanes load(const DBL *x) { return Lanes(*x); }
+    QX_INLINE void store(DBL *x) const { *x = v; }
+    static QX_INLINE Lanes gather(const DBL *x, std::ptrdiff_t) { return Lanes(*x); }
+    QX_INLINE void scatter(DBL *x, std::ptrdiff_t) const { *x = v; }
+    QX_INLINE Lanes reversed() const { return *this; }
+    QX_INLINE double operator[](int) const { return v; }
 
-    friend Lanes operator+(Lanes a, Lanes b) { return Lanes(a.v + b.v); }
-    friend Lanes operator-(Lanes a, Lanes b) { return Lanes(a.v - b.v); }
-    friend Lanes operator*(Lanes a, Lanes b) { return Lanes(a.v * b.v); }
-    friend Lanes operator/(Lanes a, Lanes b) { return Lanes(a.v / b.v); }
-    friend Lanes operator-(Lanes a) { return Lanes(-a.v); }
+    friend QX_INLINE Lanes operator+(Lanes a, Lanes b) { return Lanes(a.v + b.v); }
+    friend QX_INLINE Lanes operator-(Lanes a, Lanes b) { return Lanes(a.v - b.v); }
+    friend QX_INLINE Lanes operator*(Lanes a, Lanes b) { return Lanes(a.v * b.v); }
+    friend QX_INLINE Lanes operator/(Lanes a, Lanes b) { return Lanes(a.v / b.v); }
+    friend QX_INLINE Lanes operator-(Lanes a) { return Lanes(-a.v); }
 
     double v;
 };
 
+} // inline namespace
 } // namespace qx
 
 #endif

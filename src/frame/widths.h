@@ -1,25 +1,59 @@
 #ifndef QX_FRAME_WIDTHS_H
 #define QX_FRAME_WIDTHS_H
 
+#include <cstdint>
+
 // Routines over lanes exist once per width of the processor. A header declares such a routine with
 // one line,
 //
 //     QX_BY_WIDTH(void, AddArrays, (const DBL *x, const DBL *y, DBL *sum, int32_t n))
 //
-// and a source in the LANES list of the family's CMakeLists.txt defines it in the namespace of the
-// width that it is being compiled for:
+// and a source in the LANES list of the family's CMakeLists.txt, which is compiled for each width,
+// defines it in the namespace of the width:
 //
 //     namespace qx::QX_WIDTH {
-//     void AddArrays(const DBL *x, const DBL *y, DBL *sum, int32_t n) { ... Lanes<nativeLanes> ... }
+//     void AddArrays(const DBL *x, const DBL *y, DBL *sum, int32_t n) { ... Lanes<nativeLanes> ...
+//     }
 //     }
 //
-// Everybody calls qx::AddArrays(...).
+// Everybody calls qx::AddArrays(...), which costs one well-predicted branch more than a plain
+// function. It is an object: it has no overloads, no default arguments and no address. Routines of
+// one width call each other directly, for they find the name in their own namespace first.
+//
+// Whatever a LANES source needs from elsewhere is a function that is no template and not inline, or
+// stands in the namespace of the width, as Lanes does: an inline function that several widths share
+// could come out of the wider build, and the linker might give it to all.
 
+#ifndef QX_WIDTH
 #define QX_WIDTH baseline
+#endif
+
+namespace qx {
+
+// The lanes of the routines that are called, 2 or 4: the most that processor and operating system
+// offer. QX_WIDTH=2 in the environment forces the smaller one. It is found when the module is
+// loaded, ahead of static initialisers; whoever comes still earlier meets 2.
+extern int32_t lanesInUse;
+
+template <auto Baseline, auto Avx2>
+struct ByWidth;
+template <class Result, class... Arguments, Result (*Baseline)(Arguments...),
+          Result (*Avx2)(Arguments...)>
+struct ByWidth<Baseline, Avx2> {
+    __attribute__((always_inline)) Result operator()(Arguments... arguments) const {
+        return lanesInUse == 4 ? Avx2(arguments...) : Baseline(arguments...);
+    }
+};
+
+} // namespace qx
+
 #define QX_BY_WIDTH(result, name, parameters)                                                      \
     namespace baseline {                                                                           \
     result name parameters;                                                                        \
     }                                                                                              \
-    using baseline::name;
+    namespace avx2 {                                                                               \
+    result name parameters;                                                                        \
+    }                                                                                              \
+    constexpr ByWidth<baseline::name, avx2::name> name{};
 
 #endif

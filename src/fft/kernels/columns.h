@@ -6,12 +6,12 @@
 // How the straight-line transforms meet memory: each type here is an `in` or an `out` of theirs for
 // one layout. Strides count in DBL units; `leg` leads from value j of a column to value j + 1.
 
-namespace qx {
+namespace qx::QX_WIDTH {
 
 using std::ptrdiff_t;
 
 // Columns of packed complex values that stand in one Wide.
-inline constexpr int packedColumns = nativeLanes / 2;
+constexpr int packedColumns = nativeLanes / 2;
 
 // ---- Columns copied to the stack ----
 //
@@ -19,7 +19,7 @@ inline constexpr int packedColumns = nativeLanes / 2;
 // few sets of the cache, and what one column brings in is gone before its neighbour reads it. So
 // several neighbours are copied to the stack at once, by whole cache lines.
 
-inline constexpr bool legsCollide(ptrdiff_t leg, int p) {
+constexpr bool legsCollide(ptrdiff_t leg, int p) {
     return p > 4 && leg * ptrdiff_t{sizeof(DBL)} % 2048 == 0;
 }
 
@@ -178,7 +178,7 @@ struct RealGatherIn { // columns anywhere
     const DBL *x[nativeLanes];
     ptrdiff_t leg;
     QX_INLINE Wide at(int j) const {
-#ifdef __AVX__
+#ifdef __AVX2__
         return Wide(Wide::Vector{x[0][j * leg], x[1][j * leg], x[2][j * leg], x[3][j * leg]});
 #else
         return Wide(Wide::Vector{x[0][j * leg], x[1][j * leg]});
@@ -193,7 +193,7 @@ struct RealBlocksOut { // transform by transform
             h[lane][k] = a[lane];
     }
     QX_INLINE void setPair(int k, Wide a, Wide b) const {
-#ifdef __AVX__
+#ifdef __AVX2__
         DBL *const even[] = {h[0], h[2]};
         DBL *const odd[] = {h[1], h[3]};
 #else
@@ -243,6 +243,6 @@ struct PairLanesOut {
     }
 };
 
-} // namespace qx
+} // namespace qx::QX_WIDTH
 
 #endif

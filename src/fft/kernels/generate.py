@@ -413,11 +413,11 @@ def file_of(p):
     maker = "MakeKernels" if p in RADICES else "MakeWholeKernels"
     return "\n".join([
         f"// The kernels of {p}, made by fft/kernels/generate.py.\n",
-        "#include \"fft/kernels/kernel_set.h\"\n\nnamespace qx {\n",
+        "#include \"fft/kernels/kernel_set.h\"\n\nnamespace qx::QX_WIDTH {\n",
         *texts,
-        f"template <>\nconst KernelSet &KernelsFor<{p}>() {{",
-        f"    static constexpr KernelSet kernels = {maker}<{p}>();\n    return kernels;\n}}\n",
-        "} // namespace qx\n"])
+        f"template <>\nconst KernelSet *KernelsFor<{p}>() {{",
+        f"    static constexpr KernelSet kernels = {maker}<{p}>();\n    return &kernels;\n}}\n",
+        "} // namespace qx::QX_WIDTH\n"])
 
 
 def main():

@@ -4,18 +4,16 @@
 #include "fft/kernels/columns.h"
 #include "fft/kernels/kernels.h"
 
-#include <algorithm>
-
 // The loops around the straight-line transforms of one radix.
 
-namespace qx {
+namespace qx::QX_WIDTH {
 
 // ---- Large bodies stand alone ----
 //
 // The transforms of the larger primes are so long that one copy of each, between arrays, serves all
 // loops. Narrower data rides along in the first lanes, which takes no longer.
 
-inline constexpr bool standsAlone(int radix) { return radix >= 17 && radix % 2; }
+constexpr bool standsAlone(int radix) { return radix >= 17 && radix % 2; }
 
 struct PackedArrayIn {
     const Wide *x;
@@ -45,7 +43,7 @@ __attribute__((noinline)) void RealInArrays(const Wide *x, Wide *h) {
 
 QX_INLINE Wide Widened(Narrow x) { return Wide(x.v); }
 QX_INLINE Wide Widened(Wide x) { return x; }
-#ifdef __AVX__
+#ifdef __AVX2__
 QX_INLINE Wide Widened(One x) { return Wide(__builtin_shufflevector(x.v, x.v, 0, 1, 0, 1)); }
 #endif
 
@@ -268,8 +266,10 @@ void ComplexTwiddleKernel(DBL *re, DBL *im, const DBL *twiddleCos, const DBL *tw
                           ptrdiff_t stride, int32_t m) {
     const ptrdiff_t leg = m * stride;
     double one[P], zero[P]; // for column 0, which is treated as in lanes
-    std::fill(one, one + P, 1.0);
-    std::fill(zero, zero + P, 0.0);
+    for (int j = 0; j < P; ++j) {
+        one[j] = 1.0;
+        zero[j] = 0.0;
+    }
     for (ptrdiff_t k = 0; k < m; ++k) {
         const ptrdiff_t entry = (k - 1) * (P - 1);
         DBL *const columnRe = re + k * stride;
@@ -417,6 +417,6 @@ constexpr KernelSet MakeWholeKernels() {
             ComplexSideBySide<P>, RealSideBySide<P>};
 }
 
-} // namespace qx
+} // namespace qx::QX_WIDTH
 
 #endif

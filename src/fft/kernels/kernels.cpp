@@ -2,32 +2,32 @@
 
 #include "frame/lanes.h"
 
-namespace qx {
+namespace qx::QX_WIDTH {
 namespace {
 
 using std::ptrdiff_t;
 
 template <int... P>
-const KernelSet &Find(int32_t radix) {
+const KernelSet *Find(int32_t radix) {
     const KernelSet *found = nullptr;
-    ((radix == P ? found = &KernelsFor<P>() : nullptr), ...);
-    return *found;
+    ((radix == P ? found = KernelsFor<P>() : nullptr), ...);
+    return found;
 }
 
 constexpr int packedColumns = nativeLanes / 2;
 
 } // namespace
 
-const KernelSet &KernelsOf(int32_t radix) {
+const KernelSet *KernelsOf(int32_t radix) {
     return Find<2, 3, 4, 5, 7, 8, 9, 10, 11, 13, 14, 16, 17, 18, 19, 29, 31, 32, 37, 41, 43>(radix);
 }
 
 const KernelSet *WholeKernelsOf(int32_t length) {
     switch (length) {
     case 6:
-        return &KernelsFor<6>();
+        return KernelsFor<6>();
     case 12:
-        return &KernelsFor<12>();
+        return KernelsFor<12>();
     default:
         return nullptr;
     }
@@ -71,4 +71,4 @@ void FillRealLanes(const FFTStage &stage, int32_t p, int32_t m, DBL *lanes) {
     }
 }
 
-} // namespace qx
+} // namespace qx::QX_WIDTH

@@ -2,14 +2,15 @@
 #define QX_FFT_KERNELS_H
 
 #include "fft/plan.h"
+#include "frame/widths.h"
 
 #include <cstddef>
 
 namespace qx {
 
 // The radices with kernels of their own, in the order in which lengths are divided by them.
-inline constexpr int32_t kernelRadices[] = {10, 43, 41, 37, 32, 31, 29, 19, 18, 17, 16,
-                                            14, 13, 11, 9,  8,  7,  5,  4,  3,  2};
+constexpr int32_t kernelRadices[] = {10, 43, 41, 37, 32, 31, 29, 19, 18, 17, 16,
+                                     14, 13, 11, 9,  8,  7,  5,  4,  3,  2};
 
 // The columns of a leaf: a rectangle of transforms, number (a, b) with its input at
 // a inStride[0] + b inStride[1] and its output at a outStride[0] + b outStride[1]. Value j of a
@@ -22,7 +23,7 @@ struct LeafColumns {
 };
 
 // So many transforms of neighbouring inputs run together where the length allows it.
-inline constexpr int leafBundle = 8;
+constexpr int leafBundle = 8;
 
 // The kernels of one radix. The first four take any strides. The others run in SIMD lanes: complex
 // data is interleaved, results lie side by side, and twiddles come from the lane tables. Both give
@@ -43,22 +44,25 @@ struct KernelSet {
 };
 
 // The kernels of one of kernelRadices.
-const KernelSet &KernelsOf(int32_t radix);
-template <int P>
-const KernelSet &KernelsFor();
+QX_BY_WIDTH(const KernelSet *, KernelsOf, (int32_t radix))
 // Those of a length that is transformed whole although it has several factors, 6 or 12, else null.
 // They have no twiddle kernels.
-const KernelSet *WholeKernelsOf(int32_t length);
+QX_BY_WIDTH(const KernelSet *, WholeKernelsOf, (int32_t length))
+
+namespace QX_WIDTH {
+template <int P>
+const KernelSet *KernelsFor();
+}
 
 // The lane tables hold the twiddles of a stage with factor p in the order in which the kernels read
 // them: block after block of columns, as many as fill the lanes, and in a block entry by entry of
 // j from 1 to p - 1. The complex table starts at column 0 and has packed entries; the real one has
 // columns 1 to (m - 1) / 2, for the rest mirrors them, in an entry all cosines, then all sines.
 // Columns that fill no block are left out.
-int64_t ComplexLanesSize(int32_t p, int32_t m);
-int64_t RealLanesSize(int32_t p, int32_t m);
-void FillComplexLanes(const FFTStage &stage, int32_t p, int32_t m, DBL *lanes);
-void FillRealLanes(const FFTStage &stage, int32_t p, int32_t m, DBL *lanes);
+QX_BY_WIDTH(int64_t, ComplexLanesSize, (int32_t p, int32_t m))
+QX_BY_WIDTH(int64_t, RealLanesSize, (int32_t p, int32_t m))
+QX_BY_WIDTH(void, FillComplexLanes, (const FFTStage &stage, int32_t p, int32_t m, DBL *lanes))
+QX_BY_WIDTH(void, FillRealLanes, (const FFTStage &stage, int32_t p, int32_t m, DBL *lanes))
 
 } // namespace qx
 

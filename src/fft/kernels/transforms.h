@@ -7,9 +7,8 @@
 #include <cstdint>
 
 // The straight-line transforms are written once and become part of every loop that uses them.
-#define QX_INLINE __attribute__((always_inline)) inline
 
-namespace qx {
+namespace qx::QX_WIDTH {
 
 template <class V>
 struct Complex {
@@ -99,14 +98,14 @@ QX_INLINE Lanes<4> Twiddled(Lanes<4> x, Lanes<4> w) {
 // a and b interleaved pair by pair: with lanes numbered from 0, the low half is a0 b0 (a2 b2), the
 // high half a1 b1 (a3 b3). The same operations take the pairs apart again.
 QX_INLINE Wide PairsLow(Wide a, Wide b) {
-#ifdef __AVX__
+#ifdef __AVX2__
     return Wide(__builtin_shufflevector(a.v, b.v, 0, 4, 2, 6));
 #else
     return Wide(__builtin_shufflevector(a.v, b.v, 0, 2));
 #endif
 }
 QX_INLINE Wide PairsHigh(Wide a, Wide b) {
-#ifdef __AVX__
+#ifdef __AVX2__
     return Wide(__builtin_shufflevector(a.v, b.v, 1, 5, 3, 7));
 #else
     return Wide(__builtin_shufflevector(a.v, b.v, 1, 3));
@@ -115,7 +114,7 @@ QX_INLINE Wide PairsHigh(Wide a, Wide b) {
 
 // Two neighbouring doubles from each of nativeLanes / 2 places, and back.
 QX_INLINE Wide LoadPairs(const DBL *const *from, std::ptrdiff_t at) {
-#ifdef __AVX__
+#ifdef __AVX2__
     const Lanes<2> a = Lanes<2>::load(from[0] + at);
     const Lanes<2> b = Lanes<2>::load(from[1] + at);
     return Wide(__builtin_shufflevector(a.v, b.v, 0, 1, 2, 3));
@@ -124,7 +123,7 @@ QX_INLINE Wide LoadPairs(const DBL *const *from, std::ptrdiff_t at) {
 #endif
 }
 QX_INLINE void StorePairs(Wide pairs, DBL *const *to, std::ptrdiff_t at) {
-#ifdef __AVX__
+#ifdef __AVX2__
     Lanes<2>(__builtin_shufflevector(pairs.v, pairs.v, 0, 1)).store(to[0] + at);
     Lanes<2>(__builtin_shufflevector(pairs.v, pairs.v, 2, 3)).store(to[1] + at);
 #else
@@ -132,6 +131,6 @@ QX_INLINE void StorePairs(Wide pairs, DBL *const *to, std::ptrdiff_t at) {
 #endif
 }
 
-} // namespace qx
+} // namespace qx::QX_WIDTH
 
 #endif

@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 
 #include <cmath>
+#include <cstdlib>
 #include <cstring>
 
 namespace {
@@ -54,6 +55,12 @@ TYPED_TEST(LanesTest, MovesElementsAndNothingElse) {
     for (int i = 0; i < L::count; ++i)
         expected.data()[3 + 7 * i] = x.data()[L::count - 1 - i];
     EXPECT_EQ(0, std::memcmp(y.bytes + 4, expected.bytes + 4, 8 * 32));
+}
+
+TEST(Widths, AreTheProcessorsUnlessTheEnvironmentForcesTheBaseline) {
+    const char *const forced = std::getenv("QX_WIDTH");
+    const bool baseline = forced != nullptr && std::strcmp(forced, "2") == 0;
+    EXPECT_EQ(qx::lanesInUse, __builtin_cpu_supports("avx2") && !baseline ? 4 : 2);
 }
 
 } // namespace
