@@ -12,7 +12,9 @@
 
 namespace {
 
-using namespace qx::bench;
+using qx::bench::FFTWPlan;
+using qx::bench::MedianTimes;
+using qx::bench::Ratios;
 using qx::PlanReference;
 
 #ifdef QX_PEER_FFTW3

@@ -29,7 +29,9 @@ __attribute__((visibility("default"))) int32_t HostBlockReshape(int32_t, int32_t
 
 namespace {
 
-using namespace qx::bench;
+using qx::bench::Median;
+using qx::bench::Ratios;
+using qx::bench::SecondsOf;
 
 constexpr int pairs = 20000;
 

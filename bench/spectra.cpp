@@ -11,7 +11,10 @@
 
 namespace {
 
-using namespace qx::bench;
+using qx::bench::HostMemory;
+using qx::bench::Keep;
+using qx::bench::MedianTimes;
+using qx::bench::Ratios;
 
 // The spectrum works in place, so each call gets the signal anew, at the same cost on both sides;
 // the time of the copy is taken off again. (A call on the result of the one before would read

@@ -14,7 +14,9 @@
 
 namespace {
 
-using namespace qx::bench;
+using qx::bench::Keep;
+using qx::bench::MedianTimes;
+using qx::bench::Ratios;
 
 // Different arrays of one kind and length, taken in turn, so that the branch predictor does not
 // learn a short one by heart.

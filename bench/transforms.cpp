@@ -15,7 +15,10 @@
 
 namespace {
 
-using namespace qx::bench;
+using qx::bench::FFTWPlan;
+using qx::bench::HostMemory;
+using qx::bench::MedianTimes;
+using qx::bench::Ratios;
 
 #ifdef QX_PEER_FFTW3
 FFTWPlan Peer(int32_t n, fftw_r2r_kind kind, unsigned effort) {

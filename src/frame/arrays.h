@@ -73,7 +73,8 @@ protected:
     explicit Block(AnyHandle handle) : handle_(handle) {}
     T *elements() const { return reinterpret_cast<T *>(&(*handle_)[1]); }
     std::size_t bytes() const {
-        return sizeof(Array1DBlock) + sizeof(T) * static_cast<std::size_t>(size());
+        return sizeof(Array1DBlock) +
+               (isEmpty() ? 0 : sizeof(T) * static_cast<std::size_t>(size()));
     }
     AnyHandle handle_;
 };
@@ -93,8 +94,9 @@ protected:
     explicit Block(AnyHandle handle) : handle_(handle) {}
     T *elements() const { return reinterpret_cast<T *>(&(*handle_)[1]); }
     std::size_t bytes() const {
-        return sizeof(Array2DBlock) + sizeof(T) * static_cast<std::size_t>(rows()) *
-                                          static_cast<std::size_t>(cols());
+        return sizeof(Array2DBlock) + (isEmpty() ? 0
+                                                 : sizeof(T) * static_cast<std::size_t>(rows()) *
+                                                       static_cast<std::size_t>(cols()));
     }
     AnyHandle handle_;
 };
@@ -121,6 +123,15 @@ public:
     }
 };
 
+// An input that the export uses as work memory: its content is spoiled, its size is not, and a
+// failure leaves it.
+template <class Handle>
+class Spoiled : public In<Handle> {
+public:
+    using In<Handle>::In;
+    typename In<Handle>::T *data() const { return this->elements(); }
+};
+
 // An output. EmptyCode is the element type that the host is told when the output is emptied; it
 // differs from the element's own only in the few exports that were written so. A failure empties
 // the output unless it is Kept.
@@ -139,13 +150,12 @@ class Out : public Block<Handle> {
 
 public:
     Out(Handle &handle)
-        : Base(reinterpret_cast<AnyHandle>(handle)), address_(reinterpret_cast<AnyHandle *>(&handle)) {}
+        : Base(reinterpret_cast<AnyHandle>(handle)),
+          address_(reinterpret_cast<AnyHandle *>(&handle)) {}
 
     typename Base::T *data() const { return this->elements(); }
 
-    Outcome resize(int32_t count)
-        requires(dimensions == 1)
-    {
+    Outcome resize(int32_t count) requires(dimensions == 1) {
         const int32_t hostStatus = reshape(code, count);
         if (hostStatus == 0)
             (*this->handle_)->dimSize = count;
@@ -153,9 +163,7 @@ public:
     }
     // The host takes the count in int32. A product that wraps there would leave a block that is
     // smaller than its dimensions say, so it is refused as memory that cannot be had.
-    Outcome resize(int32_t rows, int32_t cols)
-        requires(dimensions == 2)
-    {
+    Outcome resize(int32_t rows, int32_t cols) requires(dimensions == 2) {
         const int64_t count = int64_t{rows} * cols;
         if (count > std::numeric_limits<int32_t>::max())
             return ErrOutOfMemory;
@@ -197,7 +205,12 @@ private:
 template <class Handle, OnFailure Failure = OnFailure::Empty>
 using InOut = Out<Handle, Failure>;
 
-// A scalar output: a failure writes the quiet NaN, to the bit, or 0 for an integer.
+// What is left in a scalar output by a failure: 0 in integers and in records of them, else the
+// quiet NaN.
+template <class T>
+inline constexpr bool FailsToZero = std::is_integral_v<T>;
+
+// A scalar output, or a record of numbers of one kind. A failure settles it, to the bit.
 template <class T>
 class OutValue {
 public:
@@ -205,12 +218,14 @@ public:
     T *address() const { return address_; }
     void operator=(const T &value) const { *address_ = value; }
     void settleFailure() const {
-        constexpr uint64_t quietNaN = 0x7FF8000000000000;
-        if constexpr (std::is_integral_v<T>)
-            *address_ = 0;
-        else
+        if constexpr (FailsToZero<T>) {
+            *address_ = T{};
+        } else {
+            constexpr uint64_t quietNaN = 0x7FF8000000000000;
+            static_assert(sizeof(T) % sizeof quietNaN == 0);
             for (std::size_t at = 0; at < sizeof(T); at += sizeof quietNaN)
                 std::memcpy(reinterpret_cast<char *>(address_) + at, &quietNaN, sizeof quietNaN);
+        }
     }
 
 private:

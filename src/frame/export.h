@@ -24,8 +24,8 @@ namespace qx {
 //   - a failure settles every output (Out, InOut, OutDBL ...), in the order of the parameters,
 //     whether the body reached it or not: arrays are emptied, scalars become NaN. Warnings and
 //     success leave them.
-//   - an In whose array is also an Out of the call reads a copy, so that a host that works in
-//     place gets the result of separate arrays.
+//   - an In or Spoiled whose array is also an Out of the call reads a copy, so that a host that
+//     works in place gets the result of separate arrays.
 //   - everything else (numbers, plain pointers, plan keepers) is handed on as it is.
 // A body is a function or a lambda whose parameters have their types written out; it returns an
 // Outcome or an ErrorCode. What a twin does differently is a template argument of its body, or a
@@ -45,6 +45,8 @@ struct ParameterKind<In<Handle>> {
     static constexpr bool isOutputArray = false;
     static constexpr bool isOutput = false;
 };
+template <class Handle>
+struct ParameterKind<Spoiled<Handle>> : ParameterKind<In<Handle>> {};
 template <class Handle, OnFailure Failure, ElementType EmptyCode>
 struct ParameterKind<Out<Handle, Failure, EmptyCode>> {
     static constexpr bool isInput = false;

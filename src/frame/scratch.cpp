@@ -69,7 +69,7 @@ void GiveBackTo(int32_t mode, void *front) {
 FrontHeader *HeaderOf(void *block) { return static_cast<FrontHeader *>(block) - 1; }
 
 // Resizes within the block's own source; null if that failed. The region has then already lost
-// the old block: the caller's export fails and does not use it again.
+// the old block.
 FrontHeader *ResizeInPlace(FrontHeader *front, int32_t mode, int32_t total) {
     if (mode == Workspace) {
         void *payload = front;
@@ -120,7 +120,11 @@ ErrorCode ScratchFree(void *block) {
     return 0;
 }
 
-ErrorCode ScratchRealloc(void **block, int32_t size) {
+namespace {
+
+// *isLost tells whether a failure has lost the block.
+ErrorCode Reallocate(void **block, int32_t size, bool *isLost) {
+    *isLost = false;
     if (size == 0) {
         ScratchFree(*block);
         *block = nullptr;
@@ -137,8 +141,10 @@ ErrorCode ScratchRealloc(void **block, int32_t size) {
     const int32_t total = size + frontSize;
     if (mode == old.mode) {
         FrontHeader *resized = ResizeInPlace(front, mode, total);
-        if (resized == nullptr)
+        if (resized == nullptr) {
+            *isLost = mode == Workspace;
             return ErrOutOfMemory;
+        }
         // kept: totalSize stays that of the first request, so a later move to another source
         // copies no more than that.
         *resized = old;
@@ -154,6 +160,24 @@ ErrorCode ScratchRealloc(void **block, int32_t size) {
     GiveBackTo(old.mode, front);
     *block = moved;
     return 0;
+}
+
+} // namespace
+
+ErrorCode ScratchRealloc(void **block, int32_t size) {
+    bool isLost;
+    return Reallocate(block, size, &isLost);
+}
+
+ErrorCode ScratchReallocOrFree(void **block, int32_t size) {
+    bool isLost;
+    const ErrorCode status = Reallocate(block, size, &isLost);
+    if (status == 0)
+        return 0;
+    if (!isLost)
+        ScratchFree(*block);
+    *block = nullptr;
+    return status;
 }
 
 ErrorCode ScratchRealloc(void **block, int32_t size, int32_t) {

@@ -6,6 +6,7 @@
 
 #include <cstdint>
 #include <limits>
+#include <utility>
 
 namespace qx {
 
@@ -20,9 +21,13 @@ ErrorCode ScratchAlloc(void **block, int32_t size, int32_t ignored);
 void *ScratchAllocPointer(int32_t size);
 // Always 0; null is allowed.
 ErrorCode ScratchFree(void *block);
-// 0, or ErrOutOfMemory. Size 0 frees and sets *block to null; a null *block allocates.
+// 0, or ErrOutOfMemory. Size 0 frees and sets *block to null; a null *block allocates. A failure
+// leaves *block alone, and its memory too, unless that lies in the workspace: then it is lost.
 ErrorCode ScratchRealloc(void **block, int32_t size);
 ErrorCode ScratchRealloc(void **block, int32_t size, int32_t ignored);
+
+// The same where a failure frees the block in any case and sets *block to null.
+ErrorCode ScratchReallocOrFree(void **block, int32_t size);
 
 // Straight from the heap, with no header. The alignment is ignored.
 void *RawAlloc(int32_t size, int32_t alignment);
@@ -39,13 +44,17 @@ inline ErrorCode Merge(ErrorCode status, ErrorCode cleanUp) {
     return replaces ? cleanUp : status;
 }
 
-// A scratch block of bytes that is given back with the scope.
+// A scratch block of bytes that is given back with the scope, or by whom it is moved to.
 class ScratchBytes {
 public:
     ScratchBytes() = default;
     ~ScratchBytes() { ScratchFree(block_); }
-    ScratchBytes(const ScratchBytes &) = delete;
-    ScratchBytes &operator=(const ScratchBytes &) = delete;
+    ScratchBytes(ScratchBytes &&other) noexcept : block_(std::exchange(other.block_, nullptr)) {}
+    ScratchBytes &operator=(ScratchBytes &&other) noexcept {
+        void *const taken = std::exchange(other.block_, nullptr);
+        ScratchFree(std::exchange(block_, taken));
+        return *this;
+    }
 
     // Takes `bytes`; a size that int32 cannot hold is a failure like any other.
     ErrorCode allocate(int64_t bytes) {
@@ -53,6 +62,15 @@ public:
         if (bytes < 0 || bytes > std::numeric_limits<int32_t>::max())
             return ErrOutOfMemory;
         return ScratchAlloc(&block_, static_cast<int32_t>(bytes));
+    }
+
+    // Changes the size and keeps what fits; grows from nothing, too. A failure gives the block up.
+    ErrorCode resize(int64_t bytes) {
+        if (bytes < 0 || bytes > std::numeric_limits<int32_t>::max()) {
+            release();
+            return ErrOutOfMemory;
+        }
+        return ScratchReallocOrFree(&block_, static_cast<int32_t>(bytes));
     }
 
     // Gives the block back early; the status is meant for Merge.
@@ -74,18 +92,20 @@ class Scratch {
 public:
     typedef typename Element<Code>::type T;
 
-    ErrorCode allocate(int64_t count) {
-        constexpr int64_t limit = std::numeric_limits<int32_t>::max() / int64_t{sizeof(T)};
-        if (count < 0 || count > limit)
-            return ErrOutOfMemory;
-        return block_.allocate(count * int64_t{sizeof(T)});
-    }
+    ErrorCode allocate(int64_t count) { return block_.allocate(bytesOf(count)); }
+    ErrorCode resize(int64_t count) { return block_.resize(bytesOf(count)); }
     ErrorCode release() { return block_.release(); }
 
     T *data() const { return static_cast<T *>(block_.bytes()); }
     T &operator[](std::ptrdiff_t i) const { return data()[i]; }
 
 private:
+    // Too many count as a size that cannot be had.
+    static int64_t bytesOf(int64_t count) {
+        constexpr int64_t limit = std::numeric_limits<int32_t>::max() / int64_t{sizeof(T)};
+        return count < 0 || count > limit ? -1 : count * int64_t{sizeof(T)};
+    }
+
     ScratchBytes block_;
 };
 

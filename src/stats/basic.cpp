@@ -1,7 +1,5 @@
 #include "stats/basic.h"
 
-#include "frame/finish.h"
-
 #include <algorithm>
 #include <cmath>
 
@@ -48,10 +46,8 @@ ErrorCode ArrayRMS(const DBL *x, int32_t n, DBL *rms) {
 }
 
 ErrorCode ArrayCxRMS(const CDB *z, int32_t n, DBL *rms) {
-    if (n < 1) {
-        SetQuietNaN(rms);
+    if (n < 1)
         return ErrEmptyInput;
-    }
     double sum = 0.0;
     for (int32_t i = 0; i < n; ++i)
         sum += z[i].im * z[i].im + z[i].re * z[i].re;

@@ -13,7 +13,7 @@ namespace qx {
 ErrorCode ArrayMean(const DBL *x, int32_t n, DBL *mean);
 // sqrt(sum(x^2) / n); the squares may overflow.
 ErrorCode ArrayRMS(const DBL *x, int32_t n, DBL *rms);
-// sqrt(sum(im^2 + re^2) / n) over n complex elements; NaN for n < 1.
+// sqrt(sum(im^2 + re^2) / n) over n complex elements.
 ErrorCode ArrayCxRMS(const CDB *z, int32_t n, DBL *rms);
 // The mean of (x - y)^2 over the shorter length m, as sum(x x + y (y - 2 x)) / m.
 // WarnLengthsDiffer if the lengths differ.

@@ -1,6 +1,5 @@
 #include "stats/distributions.h"
 
-#include "frame/finish.h"
 #include "stats/gamma.h"
 
 #include <cmath>
@@ -48,10 +47,8 @@ ErrorCode NormalCDF(double x, DBL *p) {
 ErrorCode StudentCDF(double t, int32_t dof, DBL *p) {
     if (dof < 1)
         return ErrTooFewForParameters;
-    if (std::isnan(t)) {
-        SetQuietNaN(p);
+    if (std::isnan(t))
         return ErrNaNInData;
-    }
     const double u = std::fabs(t);
     const double tail = u == 0.0 ? 0.5 : 0.5 * IncompleteBeta(dof / 2.0, 0.5, dof / (u * u + dof));
     *p = t < 0.0 ? tail : 1.0 - tail;
@@ -61,10 +58,8 @@ ErrorCode StudentCDF(double t, int32_t dof, DBL *p) {
 ErrorCode FisherCDF(double f, int32_t n, int32_t d, DBL *p) {
     if (n < 1 || d < 1)
         return ErrTooFewForParameters;
-    if (std::isnan(f)) {
-        SetQuietNaN(p);
+    if (std::isnan(f))
         return ErrNaNInData;
-    }
     *p = f <= 0.0 ? 0.0 : 1.0 - IncompleteBeta(d / 2.0, n / 2.0, d / (f * n + d));
     return 0;
 }

@@ -8,7 +8,7 @@ namespace qx {
 
 // Cumulative distribution functions and their inverses. Degrees of freedom that are too few give
 // ErrTooFewForParameters, a probability outside [0, 1] ErrProbabilityOutOfRange, a NaN as t or f
-// ErrNaNInData; the value is then not written, or NaN.
+// ErrNaNInData; the value is then not written.
 
 // Abramowitz and Stegun, 26.2.16; absolute error about 1e-5, on purpose not improved.
 ErrorCode NormalCDF(double x, DBL *p);

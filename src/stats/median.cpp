@@ -1,4 +1,3 @@
-#include "frame/finish.h"
 #include "frame/scratch.h"
 #include "stats/order.h"
 #include "stats/sort.h"
@@ -120,10 +119,8 @@ double MedianOf(const Middle &middle, int32_t n) {
 ErrorCode ArrayMedian(const DBL *x, int32_t n, DBL *median) {
     if (n < 1)
         return ErrEmptyInput;
-    if (HasNaN(x, n)) {
-        SetQuietNaN(median);
+    if (HasNaN(x, n))
         return ErrNaNInData;
-    }
     Scratch<ElementType::DBL> work;
     if (const ErrorCode status = work.allocate(n))
         return status;

@@ -1,11 +1,9 @@
 #include "stats/mode.h"
 
-#include "frame/scratch.h"
 #include "stats/histogram.h"
 #include "stats/order.h"
 
 #include <cmath>
-#include <limits>
 
 namespace qx {
 
@@ -30,74 +28,53 @@ struct ModeList {
     }
 };
 
-// The block trimmed to its modes, or freed where nothing occurs more than once.
-ErrorCode HandOver(void *block, const ModeList &list, DBL **modes, int32_t *count) {
+typedef Scratch<ElementType::DBL> Values;
+
+// Keeps the modes at the front of their block, or nothing where none occurs more than once.
+ErrorCode KeepModes(const ModeList &list, Values &modes, int32_t *count) {
     if (list.best <= 1)
-        return ScratchFree(block);
-    const auto bytes = static_cast<int32_t>(list.count * int64_t{sizeof(DBL)});
-    const ErrorCode status = ScratchRealloc(&block, bytes);
-    if (status < 0) {
-        ScratchFree(block); // a block that becomes smaller is never lost
-        return status;
-    }
-    *modes = static_cast<DBL *>(block);
+        return modes.release();
     *count = list.count;
-    return status;
+    return modes.resize(list.count);
 }
 
-ErrorCode AllocateValues(int32_t count, void **block) {
-    constexpr int32_t most = std::numeric_limits<int32_t>::max() / int32_t{sizeof(DBL)};
-    return count > most ? ErrOutOfMemory
-                        : ScratchAlloc(block, count * static_cast<int32_t>(sizeof(DBL)));
-}
-
-ErrorCode SingleMode(double value, DBL **modes, int32_t *count) {
-    void *block;
-    if (const ErrorCode status = AllocateValues(1, &block))
-        return status;
-    *modes = static_cast<DBL *>(block);
-    **modes = value;
+ErrorCode SingleMode(double value, Values &modes, int32_t *count) {
+    if (const ErrorCode failed = modes.allocate(1))
+        return failed;
+    modes[0] = value;
     *count = 1;
     return 0;
 }
 
-ErrorCode BinnedMode(const DBL *x, int32_t n, int32_t intervals, DBL **modes, int32_t *count) {
+ErrorCode BinnedMode(const DBL *x, int32_t n, int32_t intervals, Values &modes, int32_t *count) {
     double max, min;
     int32_t maxIndex, minIndex;
-    if (const ErrorCode status = ArrayMaxMin(x, n, &max, &maxIndex, &min, &minIndex))
-        return status;
+    if (const ErrorCode failed = ArrayMaxMin(x, n, &max, &maxIndex, &min, &minIndex))
+        return failed;
     if (std::fabs(max - min) <= std::fabs(max) * epsilon)
         return SingleMode(max, modes, count);
 
     Scratch<ElementType::I32> counts;
-    if (const ErrorCode status = counts.allocate(intervals))
-        return status;
-    void *centres;
-    if (const ErrorCode status = AllocateValues(intervals, &centres))
-        return status;
-    DBL *centre = static_cast<DBL *>(centres);
-    ErrorCode status = ArrayHistogram(x, n, min, max, counts.data(), centre, intervals);
-    if (status < 0) {
-        ScratchFree(centres);
-        return status;
-    }
+    if (const ErrorCode failed = counts.allocate(intervals))
+        return failed;
+    if (const ErrorCode failed = modes.allocate(intervals))
+        return failed;
+    DBL *const centre = modes.data();
+    if (const ErrorCode failed = ArrayHistogram(x, n, min, max, counts.data(), centre, intervals))
+        return failed;
     ModeList list = {centre, 0, 0};
     for (int32_t bin = 0; bin < intervals; ++bin)
         list.offer(centre[bin], counts[bin]);
-    status = HandOver(centres, list, modes, count);
-    return Merge(status, counts.release());
+    return Merge(KeepModes(list, modes, count), counts.release());
 }
 
-ErrorCode ExactMode(const DBL *x, int32_t n, DBL **modes, int32_t *count) {
-    void *block;
-    if (const ErrorCode status = AllocateValues(n, &block))
-        return status;
-    DBL *a = static_cast<DBL *>(block); // auto would drop the alignment
+ErrorCode ExactMode(const DBL *x, int32_t n, Values &modes, int32_t *count) {
+    if (const ErrorCode failed = modes.allocate(n))
+        return failed;
+    DBL *const a = modes.data(); // auto would drop the alignment
     SortAscending(x, n, 0, a);
-    if (std::fabs(a[0] - a[n - 1]) <= std::fabs(a[0]) * epsilon) {
-        const ModeList single = {a, n, 1};
-        return HandOver(block, single, modes, count);
-    }
+    if (std::fabs(a[0] - a[n - 1]) <= std::fabs(a[0]) * epsilon)
+        return KeepModes({a, n, 1}, modes, count);
     // NaNs stand at the front; each ends its run at once, since it compares false.
     ModeList list = {a, 1, 0};
     for (int32_t i = 0; i < n;) {
@@ -110,13 +87,13 @@ ErrorCode ExactMode(const DBL *x, int32_t n, DBL **modes, int32_t *count) {
             list.offer(value, run);
         i += run;
     }
-    return HandOver(block, list, modes, count);
+    return KeepModes(list, modes, count);
 }
 
 } // namespace
 
-ErrorCode ArrayMode(const DBL *x, int32_t n, int32_t intervals, DBL **modes, int32_t *count) {
-    *modes = nullptr;
+ErrorCode ArrayMode(const DBL *x, int32_t n, int32_t intervals, Scratch<ElementType::DBL> &modes,
+                    int32_t *count) {
     *count = 0;
     if (n <= 1)
         return n < 1 ? ErrEmptyInput : 0;

@@ -1,6 +1,7 @@
 #ifndef QX_STATS_MODE_H
 #define QX_STATS_MODE_H
 
+#include "frame/scratch.h"
 #include "qx/errors.h"
 #include "qx/types.h"
 
@@ -8,10 +9,10 @@ namespace qx {
 
 // The most frequent values. With intervals > 0: the centres of the fullest bins of a histogram
 // of so many bins; otherwise the values that occur most often, equal within a relative distance
-// of the machine epsilon. *modes is a scratch block of *count values in ascending order for the
-// caller to free, or null where there is no mode: for a single sample, and where nothing occurs
-// twice. ErrEmptyInput, ErrOutOfMemory.
-ErrorCode ArrayMode(const DBL *x, int32_t n, int32_t intervals, DBL **modes, int32_t *count);
+// of the machine epsilon. `modes` receives *count values in ascending order; there is none for
+// a single sample, and where nothing occurs twice. ErrEmptyInput, ErrOutOfMemory.
+ErrorCode ArrayMode(const DBL *x, int32_t n, int32_t intervals, Scratch<ElementType::DBL> &modes,
+                    int32_t *count);
 
 } // namespace qx
 

@@ -1,11 +1,11 @@
 #include "stats/order.h"
 
 #include "frame/elements.h"
-#include "frame/finish.h"
 #include "stats/sort.h"
 
 #include <cmath>
 #include <cstring>
+#include <limits>
 
 namespace qx {
 
@@ -61,8 +61,7 @@ ErrorCode ArrayMaxMin(const DBL *x, int32_t n, DBL *maxValue, int32_t *maxIndex,
     while (first < n && std::isnan(x[first]))
         ++first;
     if (first == n) {
-        SetQuietNaN(maxValue);
-        SetQuietNaN(minValue);
+        *maxValue = *minValue = std::numeric_limits<double>::quiet_NaN();
         *maxIndex = *minIndex = -1;
         return 0;
     }

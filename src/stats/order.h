@@ -7,7 +7,7 @@
 namespace qx {
 
 // The middle value, or the mean of the two middle ones, by selection in a scratch copy.
-// ErrEmptyInput; ErrNaNInData with *median NaN; ErrOutOfMemory.
+// ErrEmptyInput; ErrNaNInData; ErrOutOfMemory.
 ErrorCode ArrayMedian(const DBL *x, int32_t n, DBL *median);
 
 // Puts the element of rank k (from 0) in place k of a[0..n-1], everything before it smaller or

@@ -1,15 +1,9 @@
 #include "windows/constants.h"
 
-#include "frame/finish.h"
 #include "frame/scratch.h"
 #include "windows/selection.h"
 
 namespace qx {
-
-void SetConstantsNaN(WindowConstants *constants) {
-    SetQuietNaN(&constants->enbw);
-    SetQuietNaN(&constants->cg);
-}
 
 ErrorCode WindowConstantsFromTable(int32_t selector, WindowConstants *constants) {
     struct Row {
@@ -58,7 +52,6 @@ ErrorCode MeasureWindowConstants(const DBL *w, int32_t n, WindowConstants *const
 
 ErrorCode WindowConstantsByName(int32_t n, int32_t selector, double param,
                                 WindowConstants *constants) {
-    SetConstantsNaN(constants);
     if (n < 1)
         return ErrEmptyInput;
     if (CosineWindowCoefs(selector).count > 0)
@@ -68,10 +61,7 @@ ErrorCode WindowConstantsByName(int32_t n, int32_t selector, double param,
     ErrorCode status = GenerateForMeasurement(n, selector, param, window);
     if (status == 0)
         status = MeasureWindowConstants(window.data(), n, constants);
-    status = Merge(status, window.release());
-    if (status < 0)
-        SetConstantsNaN(constants);
-    return status;
+    return Merge(status, window.release());
 }
 
 } // namespace qx

@@ -6,9 +6,6 @@
 
 namespace qx {
 
-// Both constants become the quiet NaN.
-void SetConstantsNaN(WindowConstants *constants);
-
 // The stored constants of a cosine sum and of selectors 31 to 34. ErrInvalidSelector for others.
 ErrorCode WindowConstantsFromTable(int32_t selector, WindowConstants *constants);
 

@@ -135,15 +135,9 @@ ErrorCode ApplyScaledWindow(Signal x, int32_t n, int32_t selector, double param,
         *constants = {1.0, 1.0};
         return 0;
     }
-    SetConstantsNaN(constants);
     if (IsCosineSum(selector)) {
-        WindowConstants stored = {};
-        ErrorCode status = WindowConstantsFromTable(selector, &stored);
-        if (status == 0 && n > 0)
-            status = ApplyCosineWindowBySelector(x, n, selector, 1);
-        if (status == 0)
-            *constants = stored;
-        return status;
+        const ErrorCode status = WindowConstantsFromTable(selector, constants);
+        return status != 0 || n == 0 ? status : ApplyCosineWindowBySelector(x, n, selector, 1);
     }
 
     Scratch<ElementType::DBL> window;

@@ -22,7 +22,7 @@ template <class Signal>
 ErrorCode ApplySymmetricWindow(int32_t selector, Signal x, int32_t n, double param);
 
 // The periodic form divided by its coherent gain. `constants` are those of the window before
-// the division, NaN after a failure. ErrNegativeDimension, ErrInvalidSelector.
+// the division. ErrNegativeDimension, ErrInvalidSelector.
 template <class Signal>
 ErrorCode ApplyScaledWindow(Signal x, int32_t n, int32_t selector, double param,
                             WindowConstants *constants);

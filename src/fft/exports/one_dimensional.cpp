@@ -3,20 +3,14 @@
 #include "fft/plan.h"
 #include "fft/plan_slot.h"
 #include "fft/shifted_order.h"
-#include "frame/finish.h"
-#include "frame/scratch.h"
-#include "frame/views.h"
+#include "frame/export.h"
 #include "qx/fft.h"
 
 namespace qx {
 namespace {
 
-typedef In1D<ElementType::DBL> RealIn;
-typedef In1D<ElementType::CDB> ComplexIn;
-typedef InOut1D<ElementType::DBL> RealInOut;
-typedef Out1D<ElementType::CDB> ComplexOut;
 // kept: these exports size their output as DBL and empty it as CDB.
-typedef Out1D<ElementType::DBL, ElementType::CDB> RealOut;
+typedef Out<DBL1D, OnFailure::Empty, ElementType::CDB> RealOut;
 
 // Interleaved complex data as the two arrays, of stride 2, that the engine takes.
 ErrorCode ForwardInterleaved(const FFTPlan *plan, const CDB *in, CDB *out, int32_t n) {
@@ -28,19 +22,19 @@ ErrorCode InverseInterleaved(const FFTPlan *plan, const CDB *in, CDB *out, int32
 }
 
 template <class Keep>
-int32_t ComplexForward(ComplexIn in, ComplexOut out, Keep keep, int32_t offset, int32_t size,
+Outcome ComplexForward(In<CDB1D> in, Out<CDB1D> out, Keep keep, int32_t offset, int32_t size,
                        int32_t shift) {
     // kept: the offset is not checked here, in contrast to the real transform.
     if (const ErrorCode failed =
-            FirstFailed({{in.size() < 1, ErrEmptyInput}, {size < 1, ErrFFTSizeNotPositive}}))
+            FirstFailed({{in.isEmpty(), ErrEmptyInput}, {size < 1, ErrFFTSizeNotPositive}}))
         return failed;
     if (const ErrorCode failed = keep.acquire(size))
         return failed;
     InputWindow<ElementType::CDB> window;
     if (const ErrorCode failed = window.take(in.data(), in.size(), offset, size))
         return failed;
-    if (const int32_t hostStatus = out.reshape(size))
-        return hostStatus;
+    if (const Outcome bad = out.resize(size))
+        return bad;
     ErrorCode status = ForwardInterleaved(keep.plan(), window.data(), out.data(), size);
     if (status == 0 && shift != 0)
         status = RotateToShifted(out.data(), size);
@@ -48,17 +42,17 @@ int32_t ComplexForward(ComplexIn in, ComplexOut out, Keep keep, int32_t offset, 
 }
 
 template <class Keep>
-int32_t RealForward(RealIn in, ComplexOut out, Keep keep, int32_t offset, int32_t size,
+Outcome RealForward(In<DBL1D> in, Out<CDB1D> out, Keep keep, int32_t offset, int32_t size,
                     int32_t shift) {
     if (const ErrorCode failed =
-            FirstFailed({{in.size() < 1, ErrEmptyInput},
+            FirstFailed({{in.isEmpty(), ErrEmptyInput},
                          {offset < 0 || offset >= in.size(), ErrIndexOutOfRange},
                          {size < 1, ErrFFTSizeNotPositive}}))
         return failed;
     if (const ErrorCode failed = keep.acquire(size))
         return failed;
-    if (const int32_t hostStatus = out.reshape(size))
-        return hostStatus;
+    if (const Outcome bad = out.resize(size))
+        return bad;
     InputWindow<ElementType::DBL> window;
     if (const ErrorCode failed = window.take(in.data(), in.size(), offset, size))
         return failed;
@@ -71,27 +65,27 @@ int32_t RealForward(RealIn in, ComplexOut out, Keep keep, int32_t offset, int32_
 }
 
 template <class Keep>
-int32_t RealForwardHalfComplex(RealIn in, RealOut out, Keep keep) {
+Outcome RealForwardHalfComplex(In<DBL1D> in, RealOut out, Keep keep) {
     const int32_t n = in.size();
-    if (n < 1)
+    if (in.isEmpty())
         return ErrEmptyInput;
     // kept: here the output is sized before the plan is acquired.
-    if (const int32_t hostStatus = out.reshape(n))
-        return hostStatus;
+    if (const Outcome bad = out.resize(n))
+        return bad;
     if (const ErrorCode failed = keep.acquire(n))
         return failed;
     return FFTRealForward(keep.plan(), in.data(), out.data(), 1, 1, n);
 }
 
 template <class Keep>
-int32_t ComplexInverse(ComplexIn in, ComplexOut out, Keep keep, int32_t shift) {
+Outcome ComplexInverse(In<CDB1D> in, Out<CDB1D> out, Keep keep, int32_t shift) {
     const int32_t n = in.size();
-    if (n < 1)
+    if (in.isEmpty())
         return ErrEmptyInput;
     if (const ErrorCode failed = keep.acquire(n))
         return failed;
-    if (const int32_t hostStatus = out.reshape(n))
-        return hostStatus;
+    if (const Outcome bad = out.resize(n))
+        return bad;
     if (shift == 0)
         return InverseInterleaved(keep.plan(), in.data(), out.data(), n);
     Scratch<ElementType::CDB> plain;
@@ -103,30 +97,30 @@ int32_t ComplexInverse(ComplexIn in, ComplexOut out, Keep keep, int32_t shift) {
 }
 
 template <class Keep>
-int32_t RealInverse(ComplexIn in, RealOut out, Keep keep, int32_t shift) {
+Outcome RealInverse(In<CDB1D> in, RealOut out, Keep keep, int32_t shift) {
     const int32_t n = in.size();
-    if (n < 1)
+    if (in.isEmpty())
         return ErrEmptyInput;
     if (const ErrorCode failed = keep.acquire(n))
         return failed;
     Scratch<ElementType::DBL> half;
     if (const ErrorCode failed = half.allocate(n))
         return failed;
-    if (const int32_t hostStatus = out.reshape(n))
-        return hostStatus;
+    if (const Outcome bad = out.resize(n))
+        return bad;
     FFTFullToHalf(&in.data()->re, n, shift, half.data());
     const ErrorCode status = FFTRealInverse(keep.plan(), half.data(), out.data(), 1, 1, n);
     return Merge(status, half.release());
 }
 
 template <class Keep>
-int32_t RealInverseHalfComplex(RealInOut in, RealOut out, Keep keep) {
+Outcome RealInverseHalfComplex(Spoiled<DBL1D> in, RealOut out, Keep keep) {
     const int32_t n = in.size();
-    if (n < 1)
+    if (in.isEmpty())
         return ErrEmptyInput;
     // kept: here the output is sized before the plan is acquired.
-    if (const int32_t hostStatus = out.reshape(n))
-        return hostStatus;
+    if (const Outcome bad = out.resize(n))
+        return bad;
     if (const ErrorCode failed = keep.acquire(n))
         return failed;
     // kept: no copy is made, so the caller's array is left scaled by 1/n in Hartley form.
@@ -136,7 +130,9 @@ int32_t RealInverseHalfComplex(RealInOut in, RealOut out, Keep keep) {
 } // namespace
 } // namespace qx
 
-using namespace qx;
+using qx::KeepInInstance;
+using qx::KeepInSlots;
+using qx::ReturnedWithHost;
 
 ErrorCode CxOXFFTH(CDB1D in, CDB1D out, PlanSlot *slot) {
     return CxOXFFTH80(in, out, slot, 0, (*in)->dimSize, 0);
@@ -144,17 +140,14 @@ ErrorCode CxOXFFTH(CDB1D in, CDB1D out, PlanSlot *slot) {
 
 ErrorCode CxOXFFTH80(CDB1D in, CDB1D out, PlanSlot *slot, int32_t offset, int32_t size,
                      int32_t shift) {
-    const ComplexOut spectrum(out);
-    return FinishTransform(
-        ComplexForward(ComplexIn(in), spectrum, KeepInSlots(slot), offset, size, shift), spectrum);
+    return ReturnedWithHost(qx::ComplexForward<KeepInSlots>, in, out, KeepInSlots(slot), offset,
+                            size, shift);
 }
 
 ErrorCode CxOXFFTH80_IDP(CDB1D in, CDB1D out, InstanceWord *instance, int32_t offset, int32_t size,
                          int32_t shift) {
-    const ComplexOut spectrum(out);
-    return FinishTransform(
-        ComplexForward(ComplexIn(in), spectrum, KeepInInstance(instance), offset, size, shift),
-        spectrum);
+    return ReturnedWithHost(qx::ComplexForward<KeepInInstance>, in, out, KeepInInstance(instance),
+                            offset, size, shift);
 }
 
 ErrorCode InvCxOXFFTH(CDB1D in, CDB1D out, PlanSlot *slot) {
@@ -162,14 +155,12 @@ ErrorCode InvCxOXFFTH(CDB1D in, CDB1D out, PlanSlot *slot) {
 }
 
 ErrorCode InvCxOXFFTH80(CDB1D in, CDB1D out, PlanSlot *slot, int32_t shift) {
-    const ComplexOut signal(out);
-    return FinishTransform(ComplexInverse(ComplexIn(in), signal, KeepInSlots(slot), shift), signal);
+    return ReturnedWithHost(qx::ComplexInverse<KeepInSlots>, in, out, KeepInSlots(slot), shift);
 }
 
 ErrorCode InvCxOXFFTH80_IDP(CDB1D in, CDB1D out, InstanceWord *instance, int32_t shift) {
-    const ComplexOut signal(out);
-    return FinishTransform(ComplexInverse(ComplexIn(in), signal, KeepInInstance(instance), shift),
-                           signal);
+    return ReturnedWithHost(qx::ComplexInverse<KeepInInstance>, in, out, KeepInInstance(instance),
+                            shift);
 }
 
 ErrorCode ReOXFFTH(DBL1D in, CDB1D out, PlanSlot *slot) {
@@ -178,28 +169,23 @@ ErrorCode ReOXFFTH(DBL1D in, CDB1D out, PlanSlot *slot) {
 
 ErrorCode ReOXFFTH80(DBL1D in, CDB1D out, PlanSlot *slot, int32_t offset, int32_t size,
                      int32_t shift) {
-    const ComplexOut spectrum(out);
-    return FinishTransform(
-        RealForward(RealIn(in), spectrum, KeepInSlots(slot), offset, size, shift), spectrum);
+    return ReturnedWithHost(qx::RealForward<KeepInSlots>, in, out, KeepInSlots(slot), offset, size,
+                            shift);
 }
 
 ErrorCode ReOXFFTH80_IDP(DBL1D in, CDB1D out, InstanceWord *instance, int32_t offset, int32_t size,
                          int32_t shift) {
-    const ComplexOut spectrum(out);
-    return FinishTransform(
-        RealForward(RealIn(in), spectrum, KeepInInstance(instance), offset, size, shift), spectrum);
+    return ReturnedWithHost(qx::RealForward<KeepInInstance>, in, out, KeepInInstance(instance),
+                            offset, size, shift);
 }
 
 ErrorCode ReOXFFTHCH(DBL1D in, DBL1D out, PlanSlot *slot) {
-    const RealOut spectrum(out);
-    return FinishTransform(RealForwardHalfComplex(RealIn(in), spectrum, KeepInSlots(slot)),
-                           spectrum);
+    return ReturnedWithHost(qx::RealForwardHalfComplex<KeepInSlots>, in, out, KeepInSlots(slot));
 }
 
 ErrorCode ReOXFFTHCH_IDP(DBL1D in, DBL1D out, InstanceWord *instance) {
-    const RealOut spectrum(out);
-    return FinishTransform(RealForwardHalfComplex(RealIn(in), spectrum, KeepInInstance(instance)),
-                           spectrum);
+    return ReturnedWithHost(qx::RealForwardHalfComplex<KeepInInstance>, in, out,
+                            KeepInInstance(instance));
 }
 
 ErrorCode InvReOXFFTH(CDB1D in, DBL1D out, PlanSlot *slot) {
@@ -207,29 +193,24 @@ ErrorCode InvReOXFFTH(CDB1D in, DBL1D out, PlanSlot *slot) {
 }
 
 ErrorCode InvReOXFFTH80(CDB1D in, DBL1D out, PlanSlot *slot, int32_t shift) {
-    const RealOut signal(out);
-    return FinishTransform(RealInverse(ComplexIn(in), signal, KeepInSlots(slot), shift), signal);
+    return ReturnedWithHost(qx::RealInverse<KeepInSlots>, in, out, KeepInSlots(slot), shift);
 }
 
 ErrorCode InvReOXFFTH80_IDP(CDB1D in, DBL1D out, InstanceWord *instance, int32_t shift) {
-    const RealOut signal(out);
-    return FinishTransform(RealInverse(ComplexIn(in), signal, KeepInInstance(instance), shift),
-                           signal);
+    return ReturnedWithHost(qx::RealInverse<KeepInInstance>, in, out, KeepInInstance(instance),
+                            shift);
 }
 
 ErrorCode InvReOXFFTHCH(DBL1D in, DBL1D out, PlanSlot *slot) {
-    const RealOut signal(out);
-    return FinishTransform(RealInverseHalfComplex(RealInOut(in), signal, KeepInSlots(slot)),
-                           signal);
+    return ReturnedWithHost(qx::RealInverseHalfComplex<KeepInSlots>, in, out, KeepInSlots(slot));
 }
 
 ErrorCode InvReOXFFTHCH_IDP(DBL1D in, DBL1D out, InstanceWord *instance) {
-    const RealOut signal(out);
-    return FinishTransform(RealInverseHalfComplex(RealInOut(in), signal, KeepInInstance(instance)),
-                           signal);
+    return ReturnedWithHost(qx::RealInverseHalfComplex<KeepInInstance>, in, out,
+                            KeepInInstance(instance));
 }
 
 ErrorCode TransformUnreserveProc(InstanceWord *instance) {
-    TransformInstanceRelease(instance);
+    qx::TransformInstanceRelease(instance);
     return 0;
 }

@@ -1,5 +1,4 @@
-#include "frame/finish.h"
-#include "frame/views.h"
+#include "frame/export.h"
 #include "qx/frame.h"
 #include "tests/support/hostile_host.h"
 
@@ -10,94 +9,212 @@
 
 namespace {
 
-using qx::Check;
 using qx::ElementType;
+using qx::In;
+using qx::InErr;
+using qx::InErrWithHost;
+using qx::InOut;
+using qx::OnFailure;
+using qx::Out;
+using qx::Outcome;
+using qx::Returned;
+using qx::ReturnedWithHost;
+using qx::test::CDBMatrix;
+using qx::test::DBLArray;
+using qx::test::DBLMatrix;
+using qx::test::I32Array;
 using qx::test::Reshape;
 
 static_assert(sizeof(WorkspaceStatus) == 5);
 static_assert(offsetof(WorkspaceStatus, code) == 1);
 
-TEST(Frame, ElementsStandAtFourAndEight) {
-    qx::test::DBLArray x(5);
-    auto handle = x.handle();
-    const qx::In1D<ElementType::DBL> in(handle);
-    EXPECT_EQ(reinterpret_cast<const char *>(in.data()) - reinterpret_cast<char *>(*handle), 4);
+constexpr int32_t hostRefusal = 77;
+constexpr uint64_t quietNaN = 0x7FF8000000000000;
 
-    qx::test::DBLMatrix a(2, 3);
-    auto matrix = a.handle();
-    const qx::Out2D<ElementType::DBL> out(matrix);
-    EXPECT_EQ(reinterpret_cast<char *>(&out.data()[3]) - reinterpret_cast<char *>(*matrix), 32);
+TEST(Frame, ElementsStandAtFourAndEight) {
+    const DBLArray x(5);
+    const auto distance = [](const void *element, const void *block) {
+        return static_cast<const char *>(element) - static_cast<const char *>(block);
+    };
+    EXPECT_EQ(distance(In<DBL1D>(x.handle()).data(), *x.handle()), 4);
+
+    const DBLMatrix a(2, 3);
+    DBL2D matrix = a.handle();
+    EXPECT_EQ(distance(&Out<DBL2D>(matrix).data()[3], *matrix), 32);
 }
 
 TEST(Frame, ViewsFollowABlockThatMoves) {
-    qx::test::DBLArray x{1.5, 2.5};
-    auto handle = x.handle();
-    const qx::InOut1D<ElementType::DBL> view(handle);
+    const DBLArray x{1.5, 2.5};
+    DBL1D handle = x.handle();
+    InOut<DBL1D> view(handle);
     const void *before = view.data();
-    ASSERT_EQ(view.resize(3), 0);
+    ASSERT_FALSE(view.resize(3));
     EXPECT_NE(view.data(), before);
     EXPECT_EQ(view.size(), 3);
     EXPECT_EQ(x[1], 2.5);
-}
 
-TEST(Frame, AFailureEmptiesEveryOutputInOrderUnderItsOwnCode) {
-    qx::test::DBLArray x(3);
-    qx::test::I32Array i(3);
-    qx::test::CDBMatrix m(2, 2);
-    auto hx = x.handle();
-    auto hi = i.handle();
-    auto hm = m.handle();
-    const qx::Out1D<ElementType::DBL, ElementType::CDB> first(hx);
-    const qx::Out1D<ElementType::I32> second(hi);
-    const qx::Out2D<ElementType::CDB> third(hm);
-
-    EXPECT_EQ(qx::Finish(20004, first, second, third), 20004);
-    EXPECT_EQ(x.size(), 3) << "a warning keeps the outputs";
-
-    qx::test::ResetHost(2, 77);
-    EXPECT_EQ(qx::Finish(-20061, first, second, third), -20061);
-    EXPECT_EQ(qx::test::Host().reshapes, (std::vector<Reshape>{{13, 1, 0}, {3, 1, 0}, {13, 2, 0}}));
-    EXPECT_EQ(x.size(), 0);
-    EXPECT_EQ(i.size(), 0) << "also where the host refuses";
-    EXPECT_EQ(m.rows(), 0);
-    EXPECT_EQ(m.cols(), 0);
-    qx::test::ResetHost();
-}
-
-TEST(Frame, AHostStatusIsTranslatedOrPassedOn) {
-    qx::test::DBLArray x(1);
-    auto handle = x.handle();
-    const qx::Out1D<ElementType::DBL> out(handle);
-    qx::test::ResetHost(1, 77);
-    EXPECT_EQ(out.resize(4), ErrOutOfMemory);
-    qx::test::ResetHost(1, 77);
-    EXPECT_EQ(out.reshape(4), 77);
-    EXPECT_EQ(x.size(), 1) << "the size is written after a success only";
-    qx::test::ResetHost();
-    EXPECT_EQ(qx::FinishTransform(77, out), 77);
-    EXPECT_EQ(x.size(), 0);
-
-    qx::test::DBLMatrix m(1, 1);
-    auto matrix = m.handle();
-    EXPECT_EQ(qx::Out2D<ElementType::DBL>(matrix).resize(65536, 65537), ErrOutOfMemory)
+    const DBLMatrix m(1, 1);
+    DBL2D matrix = m.handle();
+    EXPECT_EQ(Out<DBL2D>(matrix).resize(65536, 65537).code(), ErrOutOfMemory)
         << "the product does not fit into the host's count";
+    EXPECT_EQ(m.rows(), 1);
+}
+
+// A body with outputs of each kind, as far as it is told to go.
+struct Outputs {
+    DBLArray x{1.0, 2.0, 3.0};
+    I32Array i = I32Array(3);
+    CDBMatrix m = CDBMatrix(2, 2);
+    DBLArray kept{4.0};
+    double scalar = 3;
+    CDB pair = {3, 4};
+    int32_t integer = 3;
+
+    template <class Ending>
+    int32_t call(Ending ending, int32_t newSize, ErrorCode status) const {
+        const auto body = [](Out<DBL1D, OnFailure::Empty, ElementType::CDB> first,
+                             Out<I32_1D> second, InOut<CDB2D>, Out<DBL1D, OnFailure::Keep>,
+                             qx::OutDBL, qx::OutCDB, qx::OutI32, int32_t size,
+                             ErrorCode code) -> Outcome {
+            if (const Outcome bad = first.resize(size))
+                return bad;
+            if (const Outcome bad = second.resize(size))
+                return bad;
+            return code;
+        };
+        DBL1D hx = x.handle();
+        I32_1D hi = i.handle();
+        CDB2D hm = m.handle();
+        DBL1D hk = kept.handle();
+        auto *self = const_cast<Outputs *>(this);
+        return ending(body, hx, hi, hm, hk, &self->scalar, &self->pair, &self->integer, newSize,
+                      status);
+    }
+    void expectSettled() const {
+        EXPECT_EQ(x.size(), 0);
+        EXPECT_EQ(i.size(), 0);
+        EXPECT_EQ(m.rows(), 0);
+        EXPECT_EQ(m.cols(), 0);
+        EXPECT_EQ(kept.size(), 1);
+        EXPECT_EQ(std::bit_cast<uint64_t>(scalar), quietNaN);
+        EXPECT_EQ(std::bit_cast<uint64_t>(double{pair.re}), quietNaN);
+        EXPECT_EQ(std::bit_cast<uint64_t>(double{pair.im}), quietNaN);
+        EXPECT_EQ(integer, 0);
+    }
+    void expectKept(int32_t newSize) const {
+        EXPECT_EQ(x.size(), newSize);
+        EXPECT_EQ(i.size(), newSize);
+        EXPECT_EQ(m.rows(), 2);
+        EXPECT_EQ(scalar, 3);
+        EXPECT_EQ(pair.im, 4);
+        EXPECT_EQ(integer, 3);
+    }
+};
+
+const auto returned = [](auto &&...call) { return Returned(call...); };
+const auto returnedWithHost = [](auto &&...call) { return ReturnedWithHost(call...); };
+
+TEST(Frame, AFailureSettlesEveryOutputInOrderAndWarningsLeaveThem) {
+    for (const ErrorCode status : {0, 20004}) {
+        const Outputs outputs;
+        EXPECT_EQ(outputs.call(returned, 5, status), status);
+        outputs.expectKept(5);
+    }
+    const Outputs outputs;
+    qx::test::ResetHost(4, hostRefusal);
+    EXPECT_EQ(outputs.call(returned, 5, -20061), -20061);
+    // The third is told another element than its own; the fourth is refused and emptied all the
+    // same; the kept one is not asked for.
+    EXPECT_EQ(qx::test::Host().reshapes,
+              (std::vector<Reshape>{{10, 1, 5}, {3, 1, 5}, {13, 1, 0}, {3, 1, 0}, {13, 2, 0}}));
+    outputs.expectSettled();
+    qx::test::ResetHost();
+}
+
+TEST(Frame, EachEndingTellsCodesAndTheHostsStatusInItsWay) {
+    ErrorCode err = 0;
+    const auto inErr = [&err](auto &&...call) { return InErr(&err, call...); };
+    const auto inErrWithHost = [&err](auto &&...call) { return InErrWithHost(&err, call...); };
+    const auto expect = [&err](auto ending, ErrorCode status, bool isRefused, int32_t result,
+                               ErrorCode code) {
+        // A positive status of the host is a refusal like any other.
+        qx::test::ResetHost(isRefused ? 2 : 0, hostRefusal);
+        err = 12345;
+        const Outputs outputs;
+        EXPECT_EQ(outputs.call(ending, 2, status), result);
+        EXPECT_EQ(err, code);
+        isRefused || status < 0 ? outputs.expectSettled() : outputs.expectKept(2);
+        qx::test::ResetHost();
+    };
+    for (const ErrorCode status : {0, 20001, -20003}) {
+        expect(returned, status, false, status, 12345);
+        expect(returnedWithHost, status, false, status, 12345);
+        expect(inErr, status, false, 0, status);
+        expect(inErrWithHost, status, false, 0, status);
+    }
+    expect(returned, 0, true, ErrOutOfMemory, 12345);
+    expect(returnedWithHost, 0, true, hostRefusal, 12345);
+    expect(inErr, 0, true, 0, ErrOutOfMemory);
+    expect(inErrWithHost, 0, true, hostRefusal, ErrOutOfMemory);
+}
+
+// Running sums of x into y, with the first element of z in front.
+ErrorCode Sums(In<DBL1D> x, In<DBL1D> z, Out<DBL1D> y) {
+    const int32_t n = x.size();
+    if (const Outcome bad = y.resize(n + 1))
+        return bad.code();
+    y.data()[0] = z.data()[0];
+    for (int32_t i = 0; i < n; ++i)
+        y.data()[i + 1] = y.data()[i] + x.data()[i];
+    return 0;
+}
+
+TEST(Frame, AnInputThatIsAnOutputIsReadFromACopy) {
+    const DBLArray x{1.0, 2.0, 3.0};
+    const DBLArray z{10.0};
+    EXPECT_EQ(returned(Sums, x.handle(), z.handle(), x.handle()), 0);
+    EXPECT_EQ(x.values(), (std::vector<double>{10, 11, 13, 16}));
+    EXPECT_EQ(returned(Sums, x.handle(), x.handle(), x.handle()), 0);
+    EXPECT_EQ(x.values(), (std::vector<double>{10, 20, 31, 44, 60}));
+    // What is read and written by intention is the array itself.
+    const auto twice = [](InOut<DBL1D> a) -> ErrorCode {
+        a.data()[0] *= 2;
+        return 0;
+    };
+    EXPECT_EQ(returned(twice, z.handle()), 0);
+    EXPECT_EQ(z[0], 20);
+}
+
+TEST(Frame, AnInputThatIsSpoiledIsSpoiledInItsCopyWhereItIsTheOutput) {
+    const auto body = [](qx::Spoiled<DBL2D> in, Out<DBL2D> out) -> Outcome {
+        if (const Outcome bad = out.resize(in.rows(), in.cols()))
+            return bad;
+        for (int32_t k = 0; k < in.rows() * in.cols(); ++k) {
+            out.data()[k] = in.data()[k] + 1;
+            in.data()[k] = -1;
+        }
+        return 0;
+    };
+    const DBLMatrix a(2, 3);
+    for (int32_t k = 0; k < 6; ++k)
+        a.data()[k] = k;
+    const DBLMatrix b;
+    EXPECT_EQ(returned(body, a.handle(), b.handle()), 0);
+    EXPECT_EQ(a.values(), std::vector<double>(6, -1));
+    EXPECT_EQ(returned(body, b.handle(), b.handle()), 0);
+    EXPECT_EQ(b.values(), (std::vector<double>{2, 3, 4, 5, 6, 7}));
+
+    // An array that claims a negative size has nothing to copy.
+    const auto sizeOf = [](In<DBL1D> in, Out<DBL1D>) -> ErrorCode { return in.isEmpty() ? -1 : 0; };
+    const DBLArray broken(1);
+    (*broken.handle())->dimSize = -1;
+    EXPECT_EQ(returned(sizeOf, broken.handle(), broken.handle()), -1);
 }
 
 TEST(Frame, ChecksDecideByTheFirstOrTheLastFailure) {
     EXPECT_EQ(qx::FirstFailed({{false, -1}, {true, -2}, {true, -3}}), -2);
     EXPECT_EQ(qx::LastFailed({{true, -1}, {true, -2}, {false, -3}}), -2);
     EXPECT_EQ(qx::FirstFailed({{false, -1}}), 0);
-}
-
-TEST(Frame, AFailedScalarIsTheQuietNaNToTheBit) {
-    double value = 3;
-    ErrorCode err = 7;
-    EXPECT_EQ(qx::Report(&err, 20004, &value), 0);
-    EXPECT_EQ(err, 20004);
-    EXPECT_EQ(value, 3);
-    EXPECT_EQ(qx::Report(&err, -20003, &value), 0);
-    EXPECT_EQ(err, -20003);
-    EXPECT_EQ(std::bit_cast<uint64_t>(value), 0x7FF8000000000000U);
 }
 
 TEST(WorkspaceExports, ReportIntoTheRecordOfTheirCaller) {

@@ -61,6 +61,7 @@ TEST(Scratch, SizesThatInt32CannotHoldAreRefused) {
     EXPECT_EQ(complexes.allocate(int64_t{1} << 40), ErrOutOfMemory);
     EXPECT_EQ(complexes.allocate(most / 16 + 1), ErrOutOfMemory);
     EXPECT_EQ(complexes.allocate(-1), ErrOutOfMemory);
+    EXPECT_EQ(complexes.resize(most / 16 + 1), ErrOutOfMemory);
     EXPECT_EQ(qx::RawAlloc(-1, 32), nullptr);
 }
 
@@ -92,6 +93,36 @@ TEST(Scratch, BlocksGoBackToWhereTheyCameFrom) {
         qx::ScratchFree(whileDisabled);
     }
     EXPECT_EQ(qx::ScratchFree(nullptr), 0);
+}
+
+TEST(Scratch, ABlockMovesGrowsAndShrinksWithItsContent) {
+    const EnabledRegion region(1000);
+    {
+        qx::Scratch<qx::ElementType::I32> first;
+        ASSERT_EQ(first.resize(2), 0);
+        first[0] = 5;
+        first[1] = 6;
+        qx::Scratch<qx::ElementType::I32> second = std::move(first);
+        EXPECT_EQ(first.data(), nullptr);
+        ASSERT_EQ(second.resize(100), 0);
+        EXPECT_EQ(second[1], 6);
+        ASSERT_EQ(second.resize(1), 0);
+        EXPECT_EQ(second[0], 5);
+        ASSERT_EQ(first.allocate(1), 0);
+        first[0] = 7;
+        second = std::move(first);
+        EXPECT_EQ(second[0], 7);
+        // A failure gives the block up, once, wherever it lies.
+        EXPECT_EQ(second.resize(10000), ErrOutOfMemory) << "more than the region has";
+        EXPECT_EQ(second.data(), nullptr);
+        EXPECT_EQ(analysisWorkspace.liveBlocks(), 0);
+    }
+    EXPECT_EQ(analysisWorkspace.liveBlocks(), 0);
+    analysisWorkspace.setEnabled(false);
+    qx::Scratch<qx::ElementType::I32> onHeap;
+    ASSERT_EQ(onHeap.allocate(2), 0);
+    EXPECT_EQ(onHeap.resize(int64_t{1} << 40), ErrOutOfMemory);
+    EXPECT_EQ(onHeap.data(), nullptr);
 }
 
 TEST(Workspace, CapacityIsExactToTheByte) {

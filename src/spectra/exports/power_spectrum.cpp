@@ -1,26 +1,22 @@
 #include "spectra/power_spectrum.h"
 
 #include "fft/plan_slot.h"
-#include "frame/finish.h"
-#include "frame/views.h"
+#include "frame/export.h"
 #include "qx/spectra.h"
 
 namespace qx {
 namespace {
 
-typedef Out1D<ElementType::DBL> RealOut;
-typedef Out1D<ElementType::CDB> ComplexOut;
-
 // Interleaved values as the bare array that the inner routines take.
-const DBL *Values(const In1D<ElementType::CDB> &in) { return &in.data()->re; }
+const DBL *Values(const In<CDB1D> &in) { return &in.data()->re; }
 
 // In all frames here the kept plan only holds the length in the cache: the inner routines take
 // a reference of their own.
 
 template <class Keep>
-ErrorCode RealPower(InOut1D<ElementType::DBL> x, Keep keep) {
+ErrorCode RealPower(InOut<DBL1D> x, Keep keep) {
     const int32_t n = x.size();
-    if (n < 1)
+    if (x.isEmpty())
         return ErrEmptyInput;
     if (const ErrorCode failed = keep.acquire(n))
         return failed;
@@ -28,15 +24,15 @@ ErrorCode RealPower(InOut1D<ElementType::DBL> x, Keep keep) {
 }
 
 template <class Keep>
-ErrorCode ComplexPower(In1D<ElementType::CDB> x, RealOut spectrum, Keep keep) {
+Outcome ComplexPower(In<CDB1D> x, Out<DBL1D> spectrum, Keep keep) {
     const int32_t n = x.size();
-    if (n < 1)
+    if (x.isEmpty())
         return ErrEmptyInput;
     // kept: here the plan comes before the resize, the reverse of the cross spectra.
     if (const ErrorCode failed = keep.acquire(n))
         return failed;
-    if (const ErrorCode failed = spectrum.resize(n))
-        return failed;
+    if (const Outcome bad = spectrum.resize(n))
+        return bad;
     return PowerSpectrumComplex(Values(x), spectrum.data(), n);
 }
 
@@ -45,13 +41,13 @@ ErrorCode CheckPair(int32_t nx, int32_t ny) {
 }
 
 template <class Keep>
-int32_t RealCross(In1D<ElementType::DBL> x, In1D<ElementType::DBL> y, ComplexOut cross, Keep keep) {
+ErrorCode RealCross(In<DBL1D> x, In<DBL1D> y, Out<CDB1D> cross, Keep keep) {
     const int32_t n = x.size();
     if (const ErrorCode failed = CheckPair(n, y.size()))
         return failed;
-    // kept: the host's own status is passed on, and a positive one leaves the output alone.
-    if (const int32_t hostStatus = cross.reshape(n))
-        return hostStatus;
+    // kept: the host's own status counts as a code, and a positive one leaves the output alone.
+    if (const Outcome bad = cross.resize(n))
+        return bad.raw();
     if (const ErrorCode failed = keep.acquire(n))
         return failed;
     CDB *const out = cross.data();
@@ -59,14 +55,13 @@ int32_t RealCross(In1D<ElementType::DBL> x, In1D<ElementType::DBL> y, ComplexOut
 }
 
 template <class Keep>
-ErrorCode ComplexCross(In1D<ElementType::CDB> x, In1D<ElementType::CDB> y, ComplexOut cross,
-                       Keep keep) {
+Outcome ComplexCross(In<CDB1D> x, In<CDB1D> y, Out<CDB1D> cross, Keep keep) {
     const int32_t n = x.size();
     if (const ErrorCode failed = CheckPair(n, y.size()))
         return failed;
     // kept: any host status is translated here, in contrast to the real cross spectrum.
-    if (const ErrorCode failed = cross.resize(n))
-        return failed;
+    if (const Outcome bad = cross.resize(n))
+        return bad;
     if (const ErrorCode failed = keep.acquire(n))
         return failed;
     return CrossSpectrumComplex(Values(x), Values(y), n, &cross.data()->re);
@@ -75,52 +70,38 @@ ErrorCode ComplexCross(In1D<ElementType::CDB> x, In1D<ElementType::CDB> y, Compl
 } // namespace
 } // namespace qx
 
-using namespace qx;
+using qx::KeepInInstance;
+using qx::KeepInSlots;
+using qx::Returned;
 
 ErrorCode SpectrumH(DBL1D x, PlanSlot *slot) {
-    const InOut1D<ElementType::DBL> spectrum(x);
-    return Finish(RealPower(spectrum, KeepInSlots(slot)), spectrum);
+    return Returned(qx::RealPower<KeepInSlots>, x, KeepInSlots(slot));
 }
 
 ErrorCode SpectrumH_IDP(DBL1D x, InstanceWord *instance) {
-    const InOut1D<ElementType::DBL> spectrum(x);
-    return Finish(RealPower(spectrum, KeepInInstance(instance)), spectrum);
+    return Returned(qx::RealPower<KeepInInstance>, x, KeepInInstance(instance));
 }
 
 ErrorCode CxSpectrumH(CDB1D x, DBL1D spectrum, PlanSlot *slot) {
-    const RealOut out(spectrum);
-    return Finish(ComplexPower(In1D<ElementType::CDB>(x), out, KeepInSlots(slot)), out);
+    return Returned(qx::ComplexPower<KeepInSlots>, x, spectrum, KeepInSlots(slot));
 }
 
 ErrorCode CxSpectrumH_IDP(CDB1D x, DBL1D spectrum, InstanceWord *instance) {
-    const RealOut out(spectrum);
-    return Finish(ComplexPower(In1D<ElementType::CDB>(x), out, KeepInInstance(instance)), out);
+    return Returned(qx::ComplexPower<KeepInInstance>, x, spectrum, KeepInInstance(instance));
 }
 
 ErrorCode CrossSpectrumH(DBL1D x, DBL1D y, CDB1D cross, PlanSlot *slot) {
-    const ComplexOut out(cross);
-    return Finish(
-        RealCross(In1D<ElementType::DBL>(x), In1D<ElementType::DBL>(y), out, KeepInSlots(slot)),
-        out);
+    return Returned(qx::RealCross<KeepInSlots>, x, y, cross, KeepInSlots(slot));
 }
 
 ErrorCode CrossSpectrumH_IDP(DBL1D x, DBL1D y, CDB1D cross, InstanceWord *instance) {
-    const ComplexOut out(cross);
-    return Finish(RealCross(In1D<ElementType::DBL>(x), In1D<ElementType::DBL>(y), out,
-                            KeepInInstance(instance)),
-                  out);
+    return Returned(qx::RealCross<KeepInInstance>, x, y, cross, KeepInInstance(instance));
 }
 
 ErrorCode CxCrossSpectrumH(CDB1D x, CDB1D y, CDB1D cross, PlanSlot *slot) {
-    const ComplexOut out(cross);
-    return Finish(
-        ComplexCross(In1D<ElementType::CDB>(x), In1D<ElementType::CDB>(y), out, KeepInSlots(slot)),
-        out);
+    return Returned(qx::ComplexCross<KeepInSlots>, x, y, cross, KeepInSlots(slot));
 }
 
 ErrorCode CxCrossSpectrumH_IDP(CDB1D x, CDB1D y, CDB1D cross, InstanceWord *instance) {
-    const ComplexOut out(cross);
-    return Finish(ComplexCross(In1D<ElementType::CDB>(x), In1D<ElementType::CDB>(y), out,
-                               KeepInInstance(instance)),
-                  out);
+    return Returned(qx::ComplexCross<KeepInInstance>, x, y, cross, KeepInInstance(instance));
 }

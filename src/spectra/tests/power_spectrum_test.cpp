@@ -12,7 +12,22 @@
 
 namespace {
 
-using namespace qx::test;
+using qx::test::CDBArray;
+using qx::test::DBLArray;
+using qx::test::Dft;
+using qx::test::HeapProbe;
+using qx::test::Host;
+using qx::test::Long;
+using qx::test::LongSpectrum;
+using qx::test::MaxError;
+using qx::test::Node;
+using qx::test::RandomComplex;
+using qx::test::RandomSignal;
+using qx::test::ResetHost;
+using qx::test::Reshape;
+using qx::test::SameBits;
+using qx::test::Signal;
+using qx::test::ToLong;
 
 constexpr double Rounding = 4e-15;
 

@@ -1,38 +1,41 @@
-#include "qx/stats.h"
-
-#include "frame/finish.h"
-#include "frame/scratch.h"
-#include "frame/views.h"
-#include "stats/mode.h"
 #include "stats/order.h"
 
-#include <cstring>
+#include "frame/export.h"
+#include "qx/stats.h"
+#include "stats/mode.h"
 
+namespace qx {
 namespace {
 
-using DBLIn = qx::In1D<qx::ElementType::DBL>;
-using DBLOut = qx::Out1D<qx::ElementType::DBL>;
+ErrorCode Median(In<DBL1D> x, OutDBL median) {
+    return ArrayMedian(x.data(), x.size(), median.address());
+}
+
+Outcome Mode(In<DBL1D> x, int32_t intervals, Out<DBL1D> modes) {
+    Scratch<ElementType::DBL> found;
+    int32_t count = 0;
+    if (const ErrorCode failed = ArrayMode(x.data(), x.size(), intervals, found, &count))
+        return failed;
+    if (count == 0) {
+        modes.empty();
+        return 0;
+    }
+    if (const Outcome bad = modes.resize(count))
+        return bad;
+    std::memcpy(modes.data(), found.data(), static_cast<std::size_t>(count) * sizeof(DBL));
+    return found.release();
+}
 
 } // namespace
+} // namespace qx
+
+using qx::InErr;
+using qx::Returned;
 
 int32_t Median_head(DBL1D x, DBL *median, ErrorCode *err) {
-    const DBLIn in(x);
-    return qx::Report(err, qx::ArrayMedian(in.data(), in.size(), median), median);
+    return InErr(err, qx::Median, x, median);
 }
 
 ErrorCode ModeH(DBL1D x, int32_t intervals, DBL1D modes) {
-    const DBLIn in(x);
-    const DBLOut out(modes);
-    DBL *found;
-    int32_t count;
-    ErrorCode status = qx::ArrayMode(in.data(), in.size(), intervals, &found, &count);
-    if (status == 0 && count > 0) {
-        status = out.resize(count);
-        if (status == 0)
-            std::memcpy(out.data(), found, static_cast<std::size_t>(count) * sizeof(DBL));
-    }
-    status = qx::Merge(status, qx::ScratchFree(found));
-    if (status < 0 || count == 0)
-        out.empty();
-    return status;
+    return Returned(qx::Mode, x, intervals, modes);
 }

@@ -1,18 +1,12 @@
 #include "transforms/separable.h"
 
 #include "fft/plan_slot.h"
-#include "frame/finish.h"
+#include "frame/export.h"
 #include "frame/heap_block.h"
-#include "frame/views.h"
 #include "qx/transforms.h"
 
 namespace qx {
 namespace {
-
-typedef In1D<ElementType::DBL> Vector;
-typedef Out1D<ElementType::DBL> VectorOut;
-typedef In2D<ElementType::DBL> Matrix;
-typedef Out2D<ElementType::DBL> MatrixOut;
 
 // What the frames of the cosine and of the sine transform do differently.
 // kept: the orders show in which code a short memory gives, and what is left behind.
@@ -33,12 +27,12 @@ struct Sine : SineTransform {
 typedef HeapBlock<ElementType::DBL> Work;
 
 template <class Transform, class Keep>
-int32_t Forward(Vector in, VectorOut out, int32_t size, Keep keep) {
-    if (in.size() < 1)
+Outcome Forward(In<DBL1D> in, Out<DBL1D> out, int32_t size, Keep keep) {
+    if (in.isEmpty())
         return ErrEmptyInput;
     const int32_t n = size < 1 ? in.size() : size;
-    if (const int32_t hostStatus = out.reshape(n))
-        return hostStatus;
+    if (const Outcome bad = out.resize(n))
+        return bad;
     Work work;
     if (!Transform::planBeforeWork)
         if (const ErrorCode failed = work.allocate(Transform::forwardWork(n)))
@@ -52,12 +46,12 @@ int32_t Forward(Vector in, VectorOut out, int32_t size, Keep keep) {
 }
 
 template <class Transform, class Keep>
-int32_t Inverse(Vector in, VectorOut out, Keep keep) {
+Outcome Inverse(In<DBL1D> in, Out<DBL1D> out, Keep keep) {
     const int32_t n = in.size();
-    if (n < 1)
+    if (in.isEmpty())
         return ErrEmptyInput;
-    if (const int32_t hostStatus = out.reshape(n))
-        return hostStatus;
+    if (const Outcome bad = out.resize(n))
+        return bad;
     Work work;
     if (!Transform::planBeforeWork)
         if (work.allocate(Transform::inverseWork(n)) != 0)
@@ -72,19 +66,19 @@ int32_t Inverse(Vector in, VectorOut out, Keep keep) {
 
 // Both plans and the output, in the order of the transform.
 template <class Transform, class Keep>
-int32_t TakePlansAndReshape(Keep keep, MatrixOut out, int32_t rows, int32_t cols) {
+Outcome TakePlansAndReshape(Keep keep, Out<DBL2D> &out, int32_t rows, int32_t cols) {
     if (!Transform::plansBeforeReshape)
-        if (const int32_t hostStatus = out.reshape(rows, cols))
-            return hostStatus;
+        if (const Outcome bad = out.resize(rows, cols))
+            return bad;
     if (const ErrorCode failed = keep.acquire(Transform::planLength(rows)))
         return failed;
     if (const ErrorCode failed = keep.acquireSecond(Transform::planLength(cols)))
         return failed;
-    return Transform::plansBeforeReshape ? out.reshape(rows, cols) : 0;
+    return Transform::plansBeforeReshape ? out.resize(rows, cols) : Outcome();
 }
 
 template <class Transform, class Keep>
-int32_t Forward2D(Matrix in, MatrixOut out, int32_t rows, int32_t cols, Keep keep) {
+Outcome Forward2D(In<DBL2D> in, Out<DBL2D> out, int32_t rows, int32_t cols, Keep keep) {
     if (in.isEmpty())
         return ErrEmptyInput;
     rows = rows < 1 ? in.rows() : rows;
@@ -92,20 +86,20 @@ int32_t Forward2D(Matrix in, MatrixOut out, int32_t rows, int32_t cols, Keep kee
     MatrixWindow window;
     if (const ErrorCode failed = window.take(in.data(), in.rows(), in.cols(), rows, cols))
         return failed;
-    if (const int32_t failed = TakePlansAndReshape<Transform>(keep, out, rows, cols))
-        return failed;
+    if (const Outcome bad = TakePlansAndReshape<Transform>(keep, out, rows, cols))
+        return bad;
     return SeparableForward<typename Transform::Routines>(keep.plan(), keep.secondPlan(),
                                                           window.data, out.data(), rows, cols);
 }
 
 template <class Transform, class Keep>
-int32_t Inverse2D(Matrix in, MatrixOut out, Keep keep) {
+Outcome Inverse2D(In<DBL2D> in, Out<DBL2D> out, Keep keep) {
     if (in.isEmpty())
         return ErrEmptyInput;
     const int32_t rows = in.rows();
     const int32_t cols = in.cols();
-    if (const int32_t failed = TakePlansAndReshape<Transform>(keep, out, rows, cols))
-        return failed;
+    if (const Outcome bad = TakePlansAndReshape<Transform>(keep, out, rows, cols))
+        return bad;
     return SeparableInverse<typename Transform::Routines>(keep.plan(), keep.secondPlan(), in.data(),
                                                           out.data(), rows, cols);
 }
@@ -113,93 +107,81 @@ int32_t Inverse2D(Matrix in, MatrixOut out, Keep keep) {
 } // namespace
 } // namespace qx
 
-using namespace qx;
+using qx::Cosine;
+using qx::KeepInInstance;
+using qx::KeepInSlots;
+using qx::ReturnedWithHost;
+using qx::Sine;
 
 ErrorCode DCT_1DH(DBL1D in, DBL1D out, int32_t size, PlanSlot *slot) {
-    const VectorOut result(out);
-    return FinishTransform(Forward<Cosine>(Vector(in), result, size, KeepInSlots(slot)), result);
+    return ReturnedWithHost(qx::Forward<Cosine, KeepInSlots>, in, out, size, KeepInSlots(slot));
 }
 
 ErrorCode DCT_1DH_IDP(DBL1D in, DBL1D out, int32_t size, InstanceWord *instance) {
-    const VectorOut result(out);
-    return FinishTransform(Forward<Cosine>(Vector(in), result, size, KeepInInstance(instance)),
-                           result);
+    return ReturnedWithHost(qx::Forward<Cosine, KeepInInstance>, in, out, size,
+                            KeepInInstance(instance));
 }
 
 ErrorCode DST_1DH(DBL1D in, DBL1D out, int32_t size, PlanSlot *slot) {
-    const VectorOut result(out);
-    return FinishTransform(Forward<Sine>(Vector(in), result, size, KeepInSlots(slot)), result);
+    return ReturnedWithHost(qx::Forward<Sine, KeepInSlots>, in, out, size, KeepInSlots(slot));
 }
 
 ErrorCode DST_1DH_IDP(DBL1D in, DBL1D out, int32_t size, InstanceWord *instance) {
-    const VectorOut result(out);
-    return FinishTransform(Forward<Sine>(Vector(in), result, size, KeepInInstance(instance)),
-                           result);
+    return ReturnedWithHost(qx::Forward<Sine, KeepInInstance>, in, out, size,
+                            KeepInInstance(instance));
 }
 
 ErrorCode InvDCT_1DH(DBL1D in, DBL1D out, PlanSlot *slot) {
-    const VectorOut result(out);
-    return FinishTransform(Inverse<Cosine>(Vector(in), result, KeepInSlots(slot)), result);
+    return ReturnedWithHost(qx::Inverse<Cosine, KeepInSlots>, in, out, KeepInSlots(slot));
 }
 
 ErrorCode InvDCT_1DH_IDP(DBL1D in, DBL1D out, InstanceWord *instance) {
-    const VectorOut result(out);
-    return FinishTransform(Inverse<Cosine>(Vector(in), result, KeepInInstance(instance)), result);
+    return ReturnedWithHost(qx::Inverse<Cosine, KeepInInstance>, in, out, KeepInInstance(instance));
 }
 
 ErrorCode InvDST_1DH(DBL1D in, DBL1D out, PlanSlot *slot) {
-    const VectorOut result(out);
-    return FinishTransform(Inverse<Sine>(Vector(in), result, KeepInSlots(slot)), result);
+    return ReturnedWithHost(qx::Inverse<Sine, KeepInSlots>, in, out, KeepInSlots(slot));
 }
 
 ErrorCode InvDST_1DH_IDP(DBL1D in, DBL1D out, InstanceWord *instance) {
-    const VectorOut result(out);
-    return FinishTransform(Inverse<Sine>(Vector(in), result, KeepInInstance(instance)), result);
+    return ReturnedWithHost(qx::Inverse<Sine, KeepInInstance>, in, out, KeepInInstance(instance));
 }
 
 ErrorCode DCT_2DH(DBL2D in, DBL2D out, int32_t rows, int32_t cols, PlanSlot *slotA,
                   PlanSlot *slotB) {
-    const MatrixOut result(out);
-    return FinishTransform(
-        Forward2D<Cosine>(Matrix(in), result, rows, cols, KeepInSlots(slotA, slotB)), result);
+    return ReturnedWithHost(qx::Forward2D<Cosine, KeepInSlots>, in, out, rows, cols,
+                            KeepInSlots(slotA, slotB));
 }
 
 ErrorCode DCT_2DH_IDP(DBL2D in, DBL2D out, int32_t rows, int32_t cols, InstanceWord *instance) {
-    const MatrixOut result(out);
-    return FinishTransform(
-        Forward2D<Cosine>(Matrix(in), result, rows, cols, KeepInInstance(instance)), result);
+    return ReturnedWithHost(qx::Forward2D<Cosine, KeepInInstance>, in, out, rows, cols,
+                            KeepInInstance(instance));
 }
 
 ErrorCode DST_2DH(DBL2D in, DBL2D out, int32_t rows, int32_t cols, PlanSlot *slotA,
                   PlanSlot *slotB) {
-    const MatrixOut result(out);
-    return FinishTransform(
-        Forward2D<Sine>(Matrix(in), result, rows, cols, KeepInSlots(slotA, slotB)), result);
+    return ReturnedWithHost(qx::Forward2D<Sine, KeepInSlots>, in, out, rows, cols,
+                            KeepInSlots(slotA, slotB));
 }
 
 ErrorCode DST_2DH_IDP(DBL2D in, DBL2D out, int32_t rows, int32_t cols, InstanceWord *instance) {
-    const MatrixOut result(out);
-    return FinishTransform(
-        Forward2D<Sine>(Matrix(in), result, rows, cols, KeepInInstance(instance)), result);
+    return ReturnedWithHost(qx::Forward2D<Sine, KeepInInstance>, in, out, rows, cols,
+                            KeepInInstance(instance));
 }
 
 ErrorCode InvDCT_2DH(DBL2D in, DBL2D out, PlanSlot *slotA, PlanSlot *slotB) {
-    const MatrixOut result(out);
-    return FinishTransform(Inverse2D<Cosine>(Matrix(in), result, KeepInSlots(slotA, slotB)),
-                           result);
+    return ReturnedWithHost(qx::Inverse2D<Cosine, KeepInSlots>, in, out, KeepInSlots(slotA, slotB));
 }
 
 ErrorCode InvDCT_2DH_IDP(DBL2D in, DBL2D out, InstanceWord *instance) {
-    const MatrixOut result(out);
-    return FinishTransform(Inverse2D<Cosine>(Matrix(in), result, KeepInInstance(instance)), result);
+    return ReturnedWithHost(qx::Inverse2D<Cosine, KeepInInstance>, in, out,
+                            KeepInInstance(instance));
 }
 
 ErrorCode InvDST_2DH(DBL2D in, DBL2D out, PlanSlot *slotA, PlanSlot *slotB) {
-    const MatrixOut result(out);
-    return FinishTransform(Inverse2D<Sine>(Matrix(in), result, KeepInSlots(slotA, slotB)), result);
+    return ReturnedWithHost(qx::Inverse2D<Sine, KeepInSlots>, in, out, KeepInSlots(slotA, slotB));
 }
 
 ErrorCode InvDST_2DH_IDP(DBL2D in, DBL2D out, InstanceWord *instance) {
-    const MatrixOut result(out);
-    return FinishTransform(Inverse2D<Sine>(Matrix(in), result, KeepInInstance(instance)), result);
+    return ReturnedWithHost(qx::Inverse2D<Sine, KeepInInstance>, in, out, KeepInInstance(instance));
 }

@@ -1,66 +1,75 @@
 #include "transforms/hartley.h"
 
 #include "fft/plan_slot.h"
-#include "frame/finish.h"
-#include "frame/views.h"
+#include "frame/export.h"
 #include "qx/transforms.h"
 
 namespace qx {
 namespace {
 
-typedef InOut1D<ElementType::DBL> Signal;
+// In both bodies the kept plan only holds the length in the cache: the inner routines take a
+// reference of their own.
 
-// What becomes of the array when no plan can be had.
-enum class WithoutPlan { EmptyArray, LeaveArray };
+template <auto Transform, class Keep>
+ErrorCode InPlace(InOut<DBL1D> x, Keep keep) {
+    if (x.isEmpty())
+        return ErrEmptyInput;
+    if (const ErrorCode failed = keep.acquire(x.size()))
+        return failed;
+    return Transform(x.data(), x.size());
+}
 
-// The kept plan only holds the length in the cache: the inner routines take a reference of their
-// own.
-template <WithoutPlan OnNoPlan = WithoutPlan::EmptyArray, class Keep>
-ErrorCode InPlace(ErrorCode (*transform)(DBL *, int32_t), const Signal &x, Keep keep) {
-    const int32_t n = x.size();
-    if (n < 1)
-        return Finish(ErrEmptyInput, x);
-    if (const ErrorCode failed = keep.acquire(n))
-        return OnNoPlan == WithoutPlan::LeaveArray ? failed : Finish(failed, x);
-    return Finish(transform(x.data(), n), x);
+// kept: without a plan the inverse Hartley transform leaves its array untouched; any other failure
+// empties it.
+template <class Keep>
+ErrorCode HartleyInverse(InOut<DBL1D, OnFailure::Keep> x, Keep keep) {
+    ErrorCode status = x.isEmpty() ? ErrEmptyInput : 0;
+    if (status == 0) {
+        if (const ErrorCode failed = keep.acquire(x.size()))
+            return failed;
+        status = FastHartleyInverse(x.data(), x.size());
+    }
+    if (status < 0)
+        x.empty();
+    return status;
 }
 
 } // namespace
 } // namespace qx
 
-using namespace qx;
+using qx::KeepInInstance;
+using qx::KeepInSlots;
+using qx::Returned;
 
 ErrorCode FHTH(DBL1D x, PlanSlot *slot) {
-    return InPlace(FastHartley, Signal(x), KeepInSlots(slot));
+    return Returned(qx::InPlace<qx::FastHartley, KeepInSlots>, x, KeepInSlots(slot));
 }
 
 ErrorCode FHTH_IDP(DBL1D x, InstanceWord *instance) {
-    return InPlace(FastHartley, Signal(x), KeepInInstance(instance));
+    return Returned(qx::InPlace<qx::FastHartley, KeepInInstance>, x, KeepInInstance(instance));
 }
 
-// kept: without a plan the inverse Hartley transform leaves its array untouched.
 ErrorCode InvFHTH(DBL1D x, PlanSlot *slot) {
-    return InPlace<WithoutPlan::LeaveArray>(FastHartleyInverse, Signal(x), KeepInSlots(slot));
+    return Returned(qx::HartleyInverse<KeepInSlots>, x, KeepInSlots(slot));
 }
 
-// kept: as in InvFHTH.
 ErrorCode InvFHTH_IDP(DBL1D x, InstanceWord *instance) {
-    return InPlace<WithoutPlan::LeaveArray>(FastHartleyInverse, Signal(x),
-                                            KeepInInstance(instance));
+    return Returned(qx::HartleyInverse<KeepInInstance>, x, KeepInInstance(instance));
 }
 
 ErrorCode FastHilbertTransformH(DBL1D x, PlanSlot *slot) {
-    return InPlace(FastHilbert, Signal(x), KeepInSlots(slot));
+    return Returned(qx::InPlace<qx::FastHilbert, KeepInSlots>, x, KeepInSlots(slot));
 }
 
 ErrorCode FastHilbertTransformH_IDP(DBL1D x, InstanceWord *instance) {
-    return InPlace(FastHilbert, Signal(x), KeepInInstance(instance));
+    return Returned(qx::InPlace<qx::FastHilbert, KeepInInstance>, x, KeepInInstance(instance));
 }
 
 ErrorCode InvFastHilbertTransformH(DBL1D x, PlanSlot *slot) {
-    return InPlace(FastHilbertInverse, Signal(x), KeepInSlots(slot));
+    return Returned(qx::InPlace<qx::FastHilbertInverse, KeepInSlots>, x, KeepInSlots(slot));
 }
 
 ErrorCode InvFastHilbertTransformH_IDP(DBL1D x, InstanceWord *instance) {
-    return InPlace(FastHilbertInverse, Signal(x), KeepInInstance(instance));
+    return Returned(qx::InPlace<qx::FastHilbertInverse, KeepInInstance>, x,
+                    KeepInInstance(instance));
 }

@@ -19,7 +19,21 @@
 
 namespace {
 
-using namespace qx::test;
+using qx::test::DBLArray;
+using qx::test::DBLMatrix;
+using qx::test::HeapProbe;
+using qx::test::Host;
+using qx::test::Long;
+using qx::test::LongSpectrum;
+using qx::test::MaxError;
+using qx::test::Node;
+using qx::test::RandomSignal;
+using qx::test::ResetHost;
+using qx::test::Reshape;
+using qx::test::SameBits;
+using qx::test::Signal;
+using qx::test::ToLong;
+using qx::test::Turn;
 
 constexpr double Rounding = 3e-15;
 

@@ -13,7 +13,19 @@
 
 namespace {
 
-using namespace qx::test;
+using qx::test::CDBArray;
+using qx::test::DBLArray;
+using qx::test::HeapProbe;
+using qx::test::LongSpectrum;
+using qx::test::MaxError;
+using qx::test::Node;
+using qx::test::RandomComplex;
+using qx::test::RandomSignal;
+using qx::test::ResetHost;
+using qx::test::SameBits;
+using qx::test::Signal;
+using qx::test::ToLong;
+using qx::test::Turn;
 
 constexpr double Rounding = 5e-15;
 

@@ -1,198 +1,213 @@
 #include "qx/windows.h"
 
-#include "frame/finish.h"
-#include "frame/views.h"
+#include "frame/export.h"
+#include "windows/constants.h"
 #include "windows/dolph_chebyshev.h"
 #include "windows/selection.h"
 #include "windows/tapers.h"
 
-// A window export is its inner routine on the caller's array, which a failure empties. The real
-// and the complex one are the same over another kind of sample.
-
+namespace qx {
 namespace {
 
-using qx::ElementType;
-using qx::In1D;
+RealSignal Samples(const InOut<DBL1D> &x) { return x.data(); }
+ComplexSignal Samples(const InOut<CDB1D> &x) { return x.data(); }
 
-template <ElementType Code>
-struct SignalOf;
-template <>
-struct SignalOf<ElementType::DBL> {
-    typedef qx::RealSignal type;
-};
-template <>
-struct SignalOf<ElementType::CDB> {
-    typedef qx::ComplexSignal type;
-};
+// A window is its inner routine on the caller's array; the real and the complex export are the
+// same over another kind of sample.
 
-template <class Handle, class Window>
-ErrorCode Apply(Handle x, Window window) {
-    constexpr ElementType code = qx::HandleTraits<Handle>::code;
-    typedef typename SignalOf<code>::type Signal;
-    const qx::InOut1D<code> samples(x);
-    return qx::Finish(window(Signal(samples.data()), samples.size()), samples);
+template <class Handle>
+ErrorCode Kaiser(InOut<Handle> x, double beta) {
+    return ApplyKaiserWindow(Samples(x), x.size(), beta);
 }
 
-template <class Window>
-ErrorCode ApplyReal(DBL1D x, Window window) {
-    return Apply(x, window);
-}
-template <class Window>
-ErrorCode ApplyComplex(CDB1D x, Window window) {
-    return Apply(x, window);
+template <class Handle>
+ErrorCode DolphChebyshev(InOut<Handle> x, double ratio, int32_t symmetric) {
+    return ApplyDolChebyWindow(Samples(x), x.size(), ratio, symmetric);
 }
 
-auto Kaiser(double beta) {
-    return [=](auto x, int32_t n) { return qx::ApplyKaiserWindow(x, n, beta); };
+template <class Handle>
+ErrorCode Gaussian(InOut<Handle> x, double sigma, int32_t symmetric) {
+    return ApplyGaussWindow(Samples(x), x.size(), sigma, symmetric);
 }
-auto DolChebyWin(double ratio, int32_t symmetric) {
-    return [=](auto x, int32_t n) { return qx::ApplyDolChebyWindow(x, n, ratio, symmetric); };
+
+template <class Handle>
+ErrorCode Force(InOut<Handle> x, double percent) {
+    return ApplyForceWindow(Samples(x), x.size(), percent);
 }
-auto GaussWin(double sigma, int32_t symmetric) {
-    return [=](auto x, int32_t n) { return qx::ApplyGaussWindow(x, n, sigma, symmetric); };
+
+template <class Handle>
+ErrorCode Exponential(InOut<Handle> x, double finalValue) {
+    return ApplyExpWindow(Samples(x), x.size(), finalValue);
 }
-auto ForceWin(double percent) {
-    return [=](auto x, int32_t n) { return qx::ApplyForceWindow(x, n, percent); };
+
+template <class Handle>
+ErrorCode CosineTapered(InOut<Handle> x, double taperRatio) {
+    return ApplyCosTaperedWindow(Samples(x), x.size(), taperRatio);
 }
-auto ExpWin(double finalValue) {
-    return [=](auto x, int32_t n) { return qx::ApplyExpWindow(x, n, finalValue); };
+
+template <class Handle>
+ErrorCode Triangle(InOut<Handle> x) {
+    return ApplyTriangleWindow(Samples(x), x.size());
 }
-auto CosTapered(double taperRatio) {
-    return [=](auto x, int32_t n) { return qx::ApplyCosTaperedWindow(x, n, taperRatio); };
+
+template <class Handle>
+ErrorCode Welch(InOut<Handle> x) {
+    return ApplyWelchWindow(Samples(x), x.size());
 }
-auto TriangleWin() {
-    return [](auto x, int32_t n) { return qx::ApplyTriangleWindow(x, n); };
+
+template <class Handle>
+ErrorCode BartlettHanning(InOut<Handle> x) {
+    return ApplyBartHannWindow(Samples(x), x.size());
 }
-auto WelchWin() {
-    return [](auto x, int32_t n) { return qx::ApplyWelchWindow(x, n); };
+
+template <class Handle>
+ErrorCode Bohman(InOut<Handle> x) {
+    return ApplyBohmanWindow(Samples(x), x.size());
 }
-auto BartHannWin() {
-    return [](auto x, int32_t n) { return qx::ApplyBartHannWindow(x, n); };
+
+template <class Handle>
+ErrorCode Parzen(InOut<Handle> x) {
+    return ApplyParzenWindow(Samples(x), x.size());
 }
-auto BohmanWin() {
-    return [](auto x, int32_t n) { return qx::ApplyBohmanWindow(x, n); };
+
+template <class Handle>
+ErrorCode CosineSum(InOut<Handle> x, In<DBL1D> coefs) {
+    return ApplyCosineSumWindow(Samples(x), x.size(), coefs.data(), coefs.size(), 0);
 }
-auto ParzenWin() {
-    return [](auto x, int32_t n) { return qx::ApplyParzenWindow(x, n); };
+
+template <class Handle>
+ErrorCode ScaledCosineSum(InOut<Handle> x, In<DBL1D> coefs) {
+    return ApplyCosineSumWindow(Samples(x), x.size(), coefs.data(), coefs.size(), 1);
 }
-auto GenCosWin(DBL1D coefs) {
-    return [a = In1D<ElementType::DBL>(coefs)](auto x, int32_t n) {
-        return qx::ApplyCosineSumWindow(x, n, a.data(), a.size(), 0);
-    };
+
+template <class Handle>
+ErrorCode CosineBySelector(InOut<Handle> x, int32_t selector, int32_t scaled) {
+    return ApplyCosineWindowBySelector(Samples(x), x.size(), selector, scaled);
 }
-auto ScaledGenCosWin(DBL1D coefs) {
-    return [a = In1D<ElementType::DBL>(coefs)](auto x, int32_t n) {
-        return qx::ApplyCosineSumWindow(x, n, a.data(), a.size(), 1);
-    };
+
+template <class Handle>
+ErrorCode Symmetric(InOut<Handle> x, int32_t selector, double param) {
+    return ApplySymmetricWindow(selector, Samples(x), x.size(), param);
 }
-auto AllCosWin(int32_t selector, int32_t scaled) {
-    return
-        [=](auto x, int32_t n) { return qx::ApplyCosineWindowBySelector(x, n, selector, scaled); };
+
+// kept: a negative size leaves the constants alone; any other failure settles them.
+template <class Handle>
+ErrorCode Scaled(InOut<Handle> x, int32_t selector, double param, WindowConstants *constants) {
+    const ErrorCode status = ApplyScaledWindow(Samples(x), x.size(), selector, param, constants);
+    if (status < 0 && status != ErrNegativeDimension)
+        OutValue<WindowConstants>(constants).settleFailure();
+    return status;
 }
-auto SymmWin(int32_t selector, double param) {
-    return [=](auto x, int32_t n) { return qx::ApplySymmetricWindow(selector, x, n, param); };
-}
-auto ScaledWin(int32_t selector, double param, WindowConstants *constants) {
-    return
-        [=](auto x, int32_t n) { return qx::ApplyScaledWindow(x, n, selector, param, constants); };
-}
-auto AllWin(int32_t selector, double param, int32_t scaled, int32_t symmetric) {
-    return [=](auto x, int32_t n) {
-        return qx::ApplyWindowBySelector(x, n, selector, param, scaled, symmetric);
-    };
+
+template <class Handle>
+ErrorCode BySelector(InOut<Handle> x, int32_t selector, double param, int32_t scaled,
+                     int32_t symmetric) {
+    return ApplyWindowBySelector(Samples(x), x.size(), selector, param, scaled, symmetric);
 }
 
 } // namespace
+} // namespace qx
 
-ErrorCode KaiserH(DBL1D x, double beta) { return ApplyReal(x, Kaiser(beta)); }
-ErrorCode CxKaiserH(CDB1D x, double beta) { return ApplyComplex(x, Kaiser(beta)); }
+using qx::InErr;
+using qx::Returned;
+
+ErrorCode KaiserH(DBL1D x, double beta) { return Returned(qx::Kaiser<DBL1D>, x, beta); }
+ErrorCode CxKaiserH(CDB1D x, double beta) { return Returned(qx::Kaiser<CDB1D>, x, beta); }
 
 ErrorCode DolChebyWinH(DBL1D x, double ratio, int32_t symmetric) {
-    return ApplyReal(x, DolChebyWin(ratio, symmetric));
+    return Returned(qx::DolphChebyshev<DBL1D>, x, ratio, symmetric);
 }
 ErrorCode CxDolChebyWinH(CDB1D x, double ratio, int32_t symmetric) {
-    return ApplyComplex(x, DolChebyWin(ratio, symmetric));
+    return Returned(qx::DolphChebyshev<CDB1D>, x, ratio, symmetric);
 }
 
 ErrorCode GaussWinH(DBL1D x, double sigma, int32_t symmetric) {
-    return ApplyReal(x, GaussWin(sigma, symmetric));
+    return Returned(qx::Gaussian<DBL1D>, x, sigma, symmetric);
 }
 ErrorCode CxGaussWinH(CDB1D x, double sigma, int32_t symmetric) {
-    return ApplyComplex(x, GaussWin(sigma, symmetric));
+    return Returned(qx::Gaussian<CDB1D>, x, sigma, symmetric);
 }
 
-ErrorCode ForceWinH(DBL1D x, double percent) { return ApplyReal(x, ForceWin(percent)); }
-ErrorCode CxForceWinH(CDB1D x, double percent) { return ApplyComplex(x, ForceWin(percent)); }
+ErrorCode ForceWinH(DBL1D x, double percent) { return Returned(qx::Force<DBL1D>, x, percent); }
+ErrorCode CxForceWinH(CDB1D x, double percent) { return Returned(qx::Force<CDB1D>, x, percent); }
 
-ErrorCode ExpWinH(DBL1D x, double finalValue) { return ApplyReal(x, ExpWin(finalValue)); }
-ErrorCode CxExpWinH(CDB1D x, double finalValue) { return ApplyComplex(x, ExpWin(finalValue)); }
+ErrorCode ExpWinH(DBL1D x, double finalValue) {
+    return Returned(qx::Exponential<DBL1D>, x, finalValue);
+}
+ErrorCode CxExpWinH(CDB1D x, double finalValue) {
+    return Returned(qx::Exponential<CDB1D>, x, finalValue);
+}
 
-ErrorCode CosTaperedH(DBL1D x, double taperRatio) { return ApplyReal(x, CosTapered(taperRatio)); }
+ErrorCode CosTaperedH(DBL1D x, double taperRatio) {
+    return Returned(qx::CosineTapered<DBL1D>, x, taperRatio);
+}
 ErrorCode CxCosTaperedH(CDB1D x, double taperRatio) {
-    return ApplyComplex(x, CosTapered(taperRatio));
+    return Returned(qx::CosineTapered<CDB1D>, x, taperRatio);
 }
 
-ErrorCode TriangleWinH(DBL1D x) { return ApplyReal(x, TriangleWin()); }
-ErrorCode CxTriangleWinH(CDB1D x) { return ApplyComplex(x, TriangleWin()); }
+ErrorCode TriangleWinH(DBL1D x) { return Returned(qx::Triangle<DBL1D>, x); }
+ErrorCode CxTriangleWinH(CDB1D x) { return Returned(qx::Triangle<CDB1D>, x); }
 
-ErrorCode WelchWinH(DBL1D x) { return ApplyReal(x, WelchWin()); }
-ErrorCode CxWelchWinH(CDB1D x) { return ApplyComplex(x, WelchWin()); }
+ErrorCode WelchWinH(DBL1D x) { return Returned(qx::Welch<DBL1D>, x); }
+ErrorCode CxWelchWinH(CDB1D x) { return Returned(qx::Welch<CDB1D>, x); }
 
-ErrorCode BartHannWinH(DBL1D x) { return ApplyReal(x, BartHannWin()); }
-ErrorCode CxBartHannWinH(CDB1D x) { return ApplyComplex(x, BartHannWin()); }
+ErrorCode BartHannWinH(DBL1D x) { return Returned(qx::BartlettHanning<DBL1D>, x); }
+ErrorCode CxBartHannWinH(CDB1D x) { return Returned(qx::BartlettHanning<CDB1D>, x); }
 
-ErrorCode BohmanWinH(DBL1D x) { return ApplyReal(x, BohmanWin()); }
-ErrorCode CxBohmanWinH(CDB1D x) { return ApplyComplex(x, BohmanWin()); }
+ErrorCode BohmanWinH(DBL1D x) { return Returned(qx::Bohman<DBL1D>, x); }
+ErrorCode CxBohmanWinH(CDB1D x) { return Returned(qx::Bohman<CDB1D>, x); }
 
-ErrorCode ParzenWinH(DBL1D x) { return ApplyReal(x, ParzenWin()); }
-ErrorCode CxParzenWinH(CDB1D x) { return ApplyComplex(x, ParzenWin()); }
+ErrorCode ParzenWinH(DBL1D x) { return Returned(qx::Parzen<DBL1D>, x); }
+ErrorCode CxParzenWinH(CDB1D x) { return Returned(qx::Parzen<CDB1D>, x); }
 
-ErrorCode GenCosWinH(DBL1D x, DBL1D coefs) { return ApplyReal(x, GenCosWin(coefs)); }
-ErrorCode CxGenCosWinH(CDB1D x, DBL1D coefs) { return ApplyComplex(x, GenCosWin(coefs)); }
+ErrorCode GenCosWinH(DBL1D x, DBL1D coefs) { return Returned(qx::CosineSum<DBL1D>, x, coefs); }
+ErrorCode CxGenCosWinH(CDB1D x, DBL1D coefs) { return Returned(qx::CosineSum<CDB1D>, x, coefs); }
 
-ErrorCode ScaledGenCosWinH(DBL1D x, DBL1D coefs) { return ApplyReal(x, ScaledGenCosWin(coefs)); }
+ErrorCode ScaledGenCosWinH(DBL1D x, DBL1D coefs) {
+    return Returned(qx::ScaledCosineSum<DBL1D>, x, coefs);
+}
 ErrorCode ScaledCxGenCosWinH(CDB1D x, DBL1D coefs) {
-    return ApplyComplex(x, ScaledGenCosWin(coefs));
+    return Returned(qx::ScaledCosineSum<CDB1D>, x, coefs);
 }
 
 ErrorCode AllCosWinH(DBL1D x, int32_t selector, int32_t scaled) {
-    return ApplyReal(x, AllCosWin(selector, scaled));
+    return Returned(qx::CosineBySelector<DBL1D>, x, selector, scaled);
 }
 ErrorCode CxAllCosWinH(CDB1D x, int32_t selector, int32_t scaled) {
-    return ApplyComplex(x, AllCosWin(selector, scaled));
+    return Returned(qx::CosineBySelector<CDB1D>, x, selector, scaled);
 }
 
 ErrorCode SymmWinH(DBL1D x, int32_t selector, double param) {
-    return ApplyReal(x, SymmWin(selector, param));
+    return Returned(qx::Symmetric<DBL1D>, x, selector, param);
 }
 ErrorCode CxSymmWinH(CDB1D x, int32_t selector, double param) {
-    return ApplyComplex(x, SymmWin(selector, param));
+    return Returned(qx::Symmetric<CDB1D>, x, selector, param);
 }
 
 ErrorCode ScaledWinH(DBL1D x, int32_t selector, double param, WindowConstants *constants) {
-    return ApplyReal(x, ScaledWin(selector, param, constants));
+    return Returned(qx::Scaled<DBL1D>, x, selector, param, constants);
 }
 ErrorCode CxScaledWinH(CDB1D x, int32_t selector, double param, WindowConstants *constants) {
-    return ApplyComplex(x, ScaledWin(selector, param, constants));
+    return Returned(qx::Scaled<CDB1D>, x, selector, param, constants);
 }
 
 ErrorCode AllWinH(DBL1D x, int32_t selector, double param, int32_t scaled, int32_t symmetric) {
-    return ApplyReal(x, AllWin(selector, param, scaled, symmetric));
+    return Returned(qx::BySelector<DBL1D>, x, selector, param, scaled, symmetric);
 }
 ErrorCode CxAllWinH(CDB1D x, int32_t selector, double param, int32_t scaled, int32_t symmetric) {
-    return ApplyComplex(x, AllWin(selector, param, scaled, symmetric));
+    return Returned(qx::BySelector<CDB1D>, x, selector, param, scaled, symmetric);
 }
 
 // The oldest: the code travels in *err.
 
 int32_t Kaiser_Bessel(DBL1D x, const DBL *beta, ErrorCode *err) {
-    return qx::Report(err, KaiserH(x, *beta));
+    return InErr(err, qx::Kaiser<DBL1D>, x, *beta);
 }
 int32_t ForceWindCIN(DBL1D x, const DBL *percent, ErrorCode *err) {
-    return qx::Report(err, ForceWinH(x, *percent));
+    return InErr(err, qx::Force<DBL1D>, x, *percent);
 }
 int32_t ExpWindCIN(DBL1D x, const DBL *finalValue, ErrorCode *err) {
-    return qx::Report(err, ExpWinH(x, *finalValue));
+    return InErr(err, qx::Exponential<DBL1D>, x, *finalValue);
 }
-int32_t TriangleWin(DBL1D x, ErrorCode *err) { return qx::Report(err, TriangleWinH(x)); }
-int32_t CosTapered(DBL1D x, ErrorCode *err) { return qx::Report(err, CosTaperedH(x, 0.2)); }
+int32_t TriangleWin(DBL1D x, ErrorCode *err) { return InErr(err, qx::Triangle<DBL1D>, x); }
+int32_t CosTapered(DBL1D x, ErrorCode *err) { return InErr(err, qx::CosineTapered<DBL1D>, x, 0.2); }

@@ -1,0 +1,27 @@
+"""What holds for every source of the tree and no compiler says."""
+
+import re
+import sys
+import unittest
+from pathlib import Path
+
+ROOT = Path(sys.argv.pop(1))
+SOURCES = sorted(path for folder in ("bench", "examples", "host", "include", "src", "tests")
+                 for path in (ROOT / folder).rglob("*") if path.suffix in (".c", ".cpp", ".h", ".hpp"))
+
+
+def lines_that(pattern, paths):
+    """The places of the lines in which the pattern is found outside a comment."""
+    return [f"{path.relative_to(ROOT)}:{number}" for path in paths
+            for number, line in enumerate(path.read_text("utf-8").split("\n"), 1)
+            if re.search(pattern, line.split("//")[0])]
+
+
+class House(unittest.TestCase):
+    def test_no_source_opens_a_whole_namespace(self):
+        self.assertIn("src/frame/export.h:4", lines_that(r"^#include", SOURCES), "a rule finds")
+        self.assertEqual(lines_that(r"\busing\s+namespace\b", SOURCES), [])
+
+
+if __name__ == "__main__":
+    unittest.main()
