@@ -7,13 +7,16 @@ if(NOT QX_PYTHON)
 endif()
 file(GLOB QX_HEADERS CONFIGURE_DEPENDS ${CMAKE_SOURCE_DIR}/include/qx/*.h)
 set(QX_CATALOGUE ${CMAKE_BINARY_DIR}/catalogue.json)
-add_custom_command(OUTPUT ${QX_CATALOGUE} ${CMAKE_BINARY_DIR}/exports.map ${CMAKE_BINARY_DIR}/exports.def
+add_custom_command(OUTPUT ${QX_CATALOGUE} ${CMAKE_BINARY_DIR}/exports.map
+        ${CMAKE_BINARY_DIR}/exports.def ${CMAKE_BINARY_DIR}/exports.codes
     COMMAND ${QX_PYTHON} ${CMAKE_SOURCE_DIR}/tools/catalogue.py ${CMAKE_SOURCE_DIR}/include
         --json ${QX_CATALOGUE} --map ${CMAKE_BINARY_DIR}/exports.map --def ${CMAKE_BINARY_DIR}/exports.def
+        --codes ${CMAKE_BINARY_DIR}/exports.codes
     DEPENDS ${QX_HEADERS} ${CMAKE_SOURCE_DIR}/tools/catalogue.py
     COMMENT "Reading the exports from the public headers" VERBATIM)
 add_custom_target(catalogue ALL
-    DEPENDS ${QX_CATALOGUE} ${CMAKE_BINARY_DIR}/exports.map ${CMAKE_BINARY_DIR}/exports.def)
+    DEPENDS ${QX_CATALOGUE} ${CMAKE_BINARY_DIR}/exports.map ${CMAKE_BINARY_DIR}/exports.def
+        ${CMAKE_BINARY_DIR}/exports.codes)
 
 # Windows shows what is marked for export and nothing else; elsewhere the linker is told.
 function(qx_show_exports_only target)

@@ -30,7 +30,9 @@ typedef void *PlanSlot;
 typedef void *InstanceWord;
 typedef double (*Function)(double x, void *context);
 
-/** One line; ErrEmptyInput, then -20001, then ErrEmptyInput, 20004 a warning, 20000 points. */
+/** One line, 20000 points.
+    Codes: ErrEmptyInput (f(x, y) is empty, or a), the host's status, ErrOutOfMemory (no memory),
+    ErrEmptyInput (counts (those) is empty), WarnLengthsDiffer (a warning). A sentence. */
 QX_API ErrorCode Everything(QX_IN DBL1D x, QX_INOUT CDB2D m, QX_IN Interval1D intervals,
                             QX_OUT I32_1D counts, int32_t n, QX_IN const int32_t *order,
                             QX_OUT DBL *value, QX_INOUT DBL *level, QX_INOUT PlanSlot *slot,
@@ -78,6 +80,8 @@ class Reading(unittest.TestCase):
             ("record", "record", "Interval", "inout"), ("function", "procedure", None, "in"),
             ("err", "error", "I32", "out")])
         self.assertEqual(everything["codes"], ["ErrEmptyInput", "ErrOutOfMemory", "WarnLengthsDiffer"])
+        self.assertTrue(everything["hostStatus"] and everything["hasStatus"])
+        self.assertFalse(forget["hasStatus"])
         self.assertEqual((everything["family"], everything["returns"]), ("shapes", "ErrorCode"))
         self.assertEqual(everything["line"], SHAPES[:SHAPES.index("QX_API ErrorCode")].count("\n") + 1)
         self.assertEqual((make["returns"], make["documentation"]),
@@ -96,16 +100,40 @@ class Reading(unittest.TestCase):
             tree(folder, shapes=SHAPES)
             out = Path(folder) / "made"
             command = [sys.executable, str(ROOT / "tools/catalogue.py"), folder, "--json",
-                       str(out / "c.json"), "--map", str(out / "c.map"), "--def", str(out / "c.def")]
+                       str(out / "c.json"), "--map", str(out / "c.map"), "--def", str(out / "c.def"), "--codes",
+                       str(out / "c.codes")]
             subprocess.run(command, check=True)
             self.assertEqual(len(json.loads((out / "c.json").read_text())["exports"]), 3)
             self.assertEqual((out / "c.map").read_text().split(),
                              "{ global: Everything; make_plan; forget; local: *; };".split())
             self.assertEqual((out / "c.def").read_text().split(),
                              "EXPORTS Everything make_plan forget".split())
+            self.assertEqual((out / "c.codes").read_text(), "Everything host -20003 -20001 20004\n")
             before = (out / "c.map").stat().st_mtime_ns
             subprocess.run(command, check=True)
             self.assertEqual((out / "c.map").stat().st_mtime_ns, before, "an unchanged file was touched")
+
+
+class TakingOver(unittest.TestCase):
+    def test_codes_and_text_come_from_the_export_that_is_named(self):
+        text = """
+/** As Second, for complex data. */ QX_API ErrorCode Third(void);
+/** As First. Differs.
+    Codes: those of First (all), ErrOverflow (too large). */ QX_API ErrorCode Second(void);
+/** The formula.
+    Codes: ErrEmptyInput (x is empty), the host's status (x). */ QX_API ErrorCode First(void);
+/** As First, without codes.
+    Codes: none. */ QX_API ErrorCode None_(void);
+/** As simple as that. */ QX_API void Other(void);
+"""
+        with tempfile.TemporaryDirectory() as folder:
+            exports = catalogue.read_headers(tree(folder, taking=text))["exports"]
+        self.assertEqual([(e["name"], e["codes"], e["hostStatus"], e["inherited"]) for e in exports], [
+            ("Third", ["ErrEmptyInput", "ErrOverflow"], True, ["Second", "First"]),
+            ("Second", ["ErrEmptyInput", "ErrOverflow"], True, ["First"]),
+            ("First", ["ErrEmptyInput"], True, []),
+            ("None_", [], False, ["First"]),
+            ("Other", [], False, [])])
 
 
 class Refusing(unittest.TestCase):
@@ -118,7 +146,7 @@ class Refusing(unittest.TestCase):
         "is an input": "\n/** A. */ QX_API void f(QX_OUT double x);",
         "const exactly": "\n/** A. */ QX_API void f(QX_IN DBL *x);",
         "const exactly if": "\n/** A. */ QX_API void f(QX_OUT const DBL *x);",
-        "must be the last": "\n/** A. */ QX_API void f(QX_OUT ErrorCode *err, int32_t n);",
+        "must be the last": "\n/** Codes: none. */ QX_API void f(QX_OUT ErrorCode *err, int32_t n);",
         "out-parameter must be QX_OUT": "\n/** A. */ QX_API void f(QX_INOUT ErrorCode *err);",
         "word must be QX_INOUT":
             "\ntypedef void *PlanSlot; /** A. */ QX_API void f(QX_IN PlanSlot *slot);",
@@ -126,8 +154,14 @@ class Refusing(unittest.TestCase):
         "unknown result type": "\n/** A. */ QX_API long f(int32_t n);",
         "a type and a name": "\n/** A. */ QX_API void f(int32_t);",
         "two arguments are called n": "\n/** A. */ QX_API void f(int32_t n, double n);",
-        "does not have": "\n/** Codes: ErrNoSuchThing. */ QX_API void f(void);",
-        "names -20009": "\n/** Codes: -20009. */ QX_API void f(void);",
+        "does not have": "\n/** Codes: ErrNoSuchThing (x). */ QX_API void f(void);",
+        "by its number, -20003": "\n/** -20003 x is empty. */ QX_API void f(void);",
+        "reason in brackets": "\n/** Codes: ErrEmptyInput. */ QX_API void f(void);",
+        "does not end in a full stop": "\n/** Codes: ErrEmptyInput (x) */ QX_API void f(void);",
+        "no sentence": "\n/** A. */ QX_API ErrorCode f(void);",
+        "has a status": "\n/** A. */ QX_API void f(QX_OUT ErrorCode *err);",
+        "which is no export": "\n/** As g, of x. */ QX_API void f(void);",
+        "from itself": "\n/** As g. */ QX_API void f(void);\n/** As f. */ QX_API void g(void);",
         "must begin": "\n/** A. */ extern QX_API void f(void);",
         "not marked QX_API": "\n/** A. */ void f(void);",
         "does not end": "\n/** A. */ QX_API void f(void)",

@@ -4,10 +4,21 @@
     catalogue.py INCLUDE_DIR --json FILE      names, arguments, documentation
     catalogue.py INCLUDE_DIR --map FILE       linker version script of exactly the exports
     catalogue.py INCLUDE_DIR --def FILE       module definition file of exactly the exports
+    catalogue.py INCLUDE_DIR --codes FILE     an export with a status a line, and its codes
 
 The headers are the one place where an export is declared. A declaration that cannot be read, an
-export without documentation, a name declared twice and an unknown error code in the documentation
-end the run with file, line and reason, and so fail the build.
+export without documentation, a name declared twice, an export with a status but without codes and
+an unknown code end the run with file, line and reason, and so fail the build.
+
+What a comment says of codes has one form, the sentence "Codes:", which ends at its full stop. Each
+code stands by its name, in the order in which it is raised, with the reason in brackets:
+
+    Codes: ErrEmptyInput (x is empty), the host's status (it refuses the output), those of SortH,
+    WarnSingular (a pivot is 0). A sentence that belongs to it no more.
+    Codes: none.
+
+A comment that begins "As NAME, ..." or "As NAME." takes over the text of that export, and its
+codes where it has no such sentence of its own.
 """
 
 import argparse
@@ -244,20 +255,84 @@ def argument_of(words, types):
     return argument
 
 
-def raised_codes(documentation, codes):
-    """The codes that a text names, by name or by number, in order; and an unknown one. A number
-    without a sign counts if it is a known warning."""
-    names = {str(number): name for name, number in codes.items()}
-    raised = []
-    for word in re.findall(r"\b(?:Err|Warn)[A-Z]\w*|(?<![\w.])[-+]?2[0-4]\d{3}(?!\w|\.\d)",
-                           documentation):
-        if word == "ErrorCode" or (word[0] == "2" and word not in names):
-            continue
-        code = word if word[0] in "EW" else names.get(word.lstrip("+"))
-        if code not in codes:
-            return raised, word
-        raised.append(code)
-    return list(dict.fromkeys(raised)), None
+HOST_STATUS = "the host's status"
+
+
+def unknown_code(documentation, codes):
+    """What a text says of codes that cannot be: a name that errors.h does not have, or a number."""
+    for name in re.findall(r"\b(?:Err|Warn)[A-Z]\w*", documentation):
+        if name not in codes and name != "ErrorCode":
+            return f"names {name}, which errors.h does not have"
+    numbers = {str(number) for number in codes.values()}
+    for word in re.findall(r"(?<![\w.])[-+]?2[0-4]\d{3}(?!\w|\.\d)", documentation):
+        if word[0] == "-" or word.lstrip("+") in numbers:
+            return f"tells a code by its number, {word}: its name and 'Codes:' are needed"
+    return None
+
+
+def codes_sentence(text):
+    """What stands between "Codes:" and the full stop that ends it, brackets left out of the search
+    for it; None where nothing of that kind is said."""
+    match = re.search(r"\bCodes:", text)
+    if not match:
+        return None
+    depth = 0
+    for position in range(match.end(), len(text)):
+        depth += (text[position] == "(") - (text[position] == ")")
+        if text[position] == "." and depth == 0:
+            return " ".join(text[match.end():position].split())
+    raise ValueError("the sentence 'Codes:' does not end in a full stop")
+
+
+def raised_by(documentation):
+    """The items of the sentence "Codes:", each a pair of a kind and a name: ("code", "ErrX"),
+    ("host", ""), ("those of", "NAME")."""
+    sentence = codes_sentence(documentation)
+    if sentence is None or sentence == "none":
+        return [] if sentence else None
+    items = []
+    for item in re.findall(r"(?:\((?:[^()]|\((?:[^()]|\([^()]*\))*\))*\)|[^,;()])+", sentence):
+        reason = r"(?: \(.+\))?"
+        if match := re.fullmatch(r"((?:Err|Warn)\w+) \(.+\)", item.strip()):
+            items.append(("code", match[1]))
+        elif re.fullmatch(HOST_STATUS + reason, item.strip()):
+            items.append(("host", ""))
+        elif match := re.fullmatch(r"those of (\w+)" + reason, item.strip()):
+            items.append(("those of", match[1]))
+        else:
+            raise ValueError(f"'{item.strip()}' under 'Codes:' is none of: a name with its reason in"
+                             f" brackets, {HOST_STATUS}, those of another export")
+    return items
+
+
+def resolve(export, by_name, path=()):
+    """Puts into an export what it takes over from others: "inherited", the names from which it has
+    text, nearest first, "codes" and "hostStatus"."""
+    if "codes" in export:
+        return
+    if export["name"] in path:
+        raise ValueError("takes over from itself")
+
+    def other(name):
+        if name not in by_name:
+            raise ValueError(f"takes over from {name}, which is no export")
+        resolve(by_name[name], by_name, (*path, export["name"]))
+        return by_name[name]
+
+    like = other(export["as"]) if export["as"] else None
+    raised = export.pop("raised")
+    if raised is None:
+        raised = [("those of", export["as"])] if like else []
+    export["inherited"] = [like["name"], *like["inherited"]] if like else []
+    codes = []
+    export["hostStatus"] = False
+    for kind, name in raised:
+        export["hostStatus"] |= kind == "host" or kind == "those of" and other(name)["hostStatus"]
+        codes += [name] if kind == "code" else other(name)["codes"] if kind == "those of" else []
+    export["codes"] = list(dict.fromkeys(codes))
+    if export["hasStatus"] and not (codes or export["hostStatus"] or export["saysNone"]):
+        raise ValueError("has a status, but its documentation has no sentence 'Codes: ...'")
+    export.pop("saysNone")
 
 
 def export_of(path, statement, types, codes):
@@ -280,9 +355,12 @@ def export_of(path, statement, types, codes):
     known = set(SCALARS) | types.opaque | {"void"}
     if not returns or not {word for word in returns if word != "*"} <= known:
         fail(f"{name}: unknown result type {spelled(returns)}")
-    raised, unknown = raised_codes(documentation, codes)
-    if unknown:
-        fail(f"{name}: the documentation names {unknown}, which errors.h does not have")
+    if unknown := unknown_code(documentation, codes):
+        fail(f"{name}: the documentation {unknown}")
+    try:
+        raised = raised_by(documentation)
+    except ValueError as error:
+        fail(f"{name}: {error}")
 
     arguments = []
     parts = split(words[opening + 1:-1])
@@ -299,8 +377,12 @@ def export_of(path, statement, types, codes):
         "name": name, "family": path.stem, "header": f"qx/{path.name}", "line": statement.line,
         "returns": spelled(returns), "declaration": spelled(words).replace(" ,", ",")
         .replace("( ", "(").replace(" (", "(").replace(" )", ")"),
-        "arguments": arguments, "codes": raised,
-        "documentation": documentation,
+        "arguments": arguments, "documentation": documentation,
+        "hasStatus": spelled(returns) == "ErrorCode" or any(
+            a["kind"] == "error" or a.get("element") == "WorkspaceStatus" for a in arguments),
+        # What resolve() makes an end of.
+        "as": like[1] if (like := re.match(r"As (\w+)[,.]", documentation)) else None,
+        "raised": raised, "saysNone": raised == [],
     }
 
 
@@ -352,6 +434,13 @@ def read_headers(include):
                 raise HeaderError(path, statement.line, "QX_API must begin the declaration")
             elif "(" in statement.words and statement.words[0] not in ("typedef", "enum"):
                 raise HeaderError(path, statement.line, "a function that is not marked QX_API")
+    by_name = {export["name"]: export for export in exports}
+    for export in exports:
+        try:
+            resolve(export, by_name)
+        except ValueError as error:
+            raise HeaderError(folder.parent / export["header"], export["line"],
+                              f"{export['name']} {error}") from error
     return {"codes": codes, "records": types.records, "families": introductions,
             "exports": exports}
 
@@ -363,6 +452,13 @@ def version_script(catalogue):
 
 def definition_file(catalogue):
     return "EXPORTS\n" + "".join(f"    {export['name']}\n" for export in catalogue["exports"])
+
+
+def code_list(catalogue):
+    """For the conformance tests: name, "host" where the host's status may come, codes."""
+    return "".join(" ".join([export["name"], *["host"] * export["hostStatus"],
+                             *(str(catalogue["codes"][code]) for code in export["codes"])]) + "\n"
+                   for export in catalogue["exports"] if export["hasStatus"])
 
 
 def write_if_changed(path, text):
@@ -379,6 +475,7 @@ def main(arguments=None):
     parser.add_argument("--json", metavar="FILE")
     parser.add_argument("--map", metavar="FILE")
     parser.add_argument("--def", metavar="FILE", dest="definition")
+    parser.add_argument("--codes", metavar="FILE")
     options = parser.parse_args(arguments)
     try:
         catalogue = read_headers(options.include)
@@ -391,6 +488,8 @@ def main(arguments=None):
         write_if_changed(options.map, version_script(catalogue))
     if options.definition:
         write_if_changed(options.definition, definition_file(catalogue))
+    if options.codes:
+        write_if_changed(options.codes, code_list(catalogue))
     return 0
 
 

@@ -34,6 +34,7 @@ pre.out { background: #fff; border-left: 3px solid #c9d3df; color: #44546a; }
 table { border-collapse: collapse; } td, th { padding: .15em 1.2em .15em 0; text-align: left;
        vertical-align: top; border-bottom: 1px solid #eef1f5; }
 figure { margin: .6em 0; } figure svg { width: 100%; height: auto; }
+.as { border-left: 3px solid #d5dbe3; padding-left: .9em; }
 ul.index { columns: 3; padding-left: 1.2em; font-size: .92em; }
 """
 KINDS = {"array1d": "array of {}", "array2d": "matrix of {}", "value": "{}",
@@ -59,7 +60,7 @@ def prose(text):
 
     for line in text.split("\n"):
         indented = line.startswith("  " if lines and table else "    ")
-        if not line or indented != table or re.match(r"-2\d{4}\b|Codes:", line):
+        if not line or indented != table or line.startswith("Codes:"):
             close()
         if line:
             table = indented
@@ -85,9 +86,12 @@ def export_text(entry, catalogue, library, signature):
         f"<td>{html.escape(library.error_text(catalogue['codes'][name]))}</td></tr>"
         for name in entry["codes"])
     declaration = html.escape(re.sub(r"QX_(IN|OUT|INOUT) ", "", entry["declaration"]))
+    taken_over = "".join(
+        f'<div class="as"><a href="{library.entries[name]["family"]}.html#{name}">{name}</a>: '
+        f"{prose(library.entries[name]['documentation'])}</div>" for name in entry["inherited"])
     return (f'<h3 id="{entry["name"]}">{entry["name"]}</h3><pre>{declaration};</pre>'
             f"<pre>{html.escape(signature)}</pre>{prose(entry['documentation'])}"
-            + (f"<table>{rows}</table>" if rows else "")
+            + taken_over + (f"<table>{rows}</table>" if rows else "")
             + (f"<table>{codes}</table>" if codes else ""))
 
 

@@ -9,28 +9,32 @@
 
 QX_BEGIN_DECLS
 
-/** Pearson's chi-square test of independence on a table of counts: the statistic, the sum of
-    (O - E)^2 / E with E = column sum times row sum / total, and the probability of a larger one
-    with (rows - 1)(columns - 1) degrees of freedom. An empty row or column gives NaN with code 0.
-    -20056 a dimension is negative; -20055 fewer than 2 rows or columns; -20001 no scratch memory;
-    -20056 a count is negative. */
+/** Pearson's chi-square test of independence on a table of counts: the statistic, the sum of (O -
+    E)^2 / E with E = column sum times row sum / total, and the probability of a larger one with
+    (rows - 1)(columns - 1) degrees of freedom. An empty row or column gives NaN with code 0.
+    Codes: ErrTableNegativeSize (a dimension is negative), ErrTableTooSmall (fewer than 2 rows or
+    columns), ErrOutOfMemory (no scratch memory), ErrTableNegativeSize (a count is negative). */
 QX_API int32_t Contingency_head(QX_IN I32_2D table, QX_OUT DBL *chiSquare, QX_OUT DBL *p,
                                 QX_OUT ErrorCode *err);
 
-/** One-way analysis of variance of y, whose element i belongs to the level labels[i], on *k
-    levels: sums and means of squares between levels and within them (error), their ratio f and
-    the probability p of a larger one. Sums of squares are formed from a single pass, so a large
-    mean costs digits.
-    -20002 the lengths differ; -20003 y is empty; -20042 k is below 2 or not below the number of
-    observations; -20001 no scratch memory; -20043 more labels than k; -20044 fewer. */
+/** One-way analysis of variance of y, whose element i belongs to the level labels[i], on *k levels:
+    sums and means of squares between levels and within them (error), their ratio f and the
+    probability p of a larger one. Sums of squares are formed from a single pass, so a large mean
+    costs digits.
+    Codes: ErrSizeMismatch (the lengths differ), ErrEmptyInput (y is empty), ErrAnovaFewLevels (k is
+    below 2 or not below the number of observations), ErrOutOfMemory (no scratch memory),
+    ErrAnovaFactorEmpty (more labels than k), ErrAnovaNoReplication (fewer). */
 QX_API int32_t Anova1Way_head(QX_IN DBL1D y, QX_IN I32_1D labels, QX_IN const int32_t *k,
                               QX_OUT DBL *ssBetween, QX_OUT DBL *msBetween, QX_OUT DBL *f,
                               QX_OUT DBL *p, QX_OUT DBL *ssError, QX_OUT DBL *msError,
                               QX_OUT DBL *ssTotal, QX_OUT ErrorCode *err);
 
-/** Anova1Way_head with the value that f exceeds with probability alpha, by bisection to 1e-4,
+/** As Anova1Way_head, with the value that f exceeds with probability alpha, by bisection to 1e-4,
     infinite for an alpha of 0.
-    Codes as for Anova1Way_head, and after -20042: -20105 alpha lies outside [0, 1]. */
+    Codes: ErrSizeMismatch (the lengths differ), ErrEmptyInput (y is empty), ErrAnovaFewLevels (k is
+    below 2 or not below the number of observations), ErrBadSignificance (alpha lies outside [0,
+    1]), ErrOutOfMemory (no scratch memory), ErrAnovaFactorEmpty (more labels than k),
+    ErrAnovaNoReplication (fewer). */
 QX_API int32_t Anova1Way_head_2017(QX_IN DBL1D y, QX_IN I32_1D labels, QX_IN const int32_t *k,
                                    double alpha, QX_OUT DBL *ssBetween, QX_OUT DBL *msBetween,
                                    QX_OUT DBL *f, QX_OUT DBL *p, QX_OUT DBL *ssError,

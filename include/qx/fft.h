@@ -1,7 +1,18 @@
 #ifndef QX_FFT_H
 #define QX_FFT_H
 
-/* Fourier transforms of any length. */
+/* Fourier transforms of any length, one- and two-dimensional, without padding. Forward: X[k] = sum
+   over j of x[j] exp(-2 pi i j k / n), unscaled. Inverse: the opposite sign and the factor 1/n.
+
+   A status of the host that refuses an output is returned as it is. Every status but 0 leaves the
+   output empty.
+
+   With `shift` non-zero a spectrum is in shifted order: index j holds frequency (j - n/2) modulo
+   n, so that the zero frequency stands at n/2.
+
+   An export keeps its plan from call to call in a slot: a word of the caller's, null at first, of
+   which the host is told so that it can clean up. An _IDP export keeps it in the host's instance
+   data, which TransformUnreserveProc gives back, and is otherwise its twin. */
 
 #include "qx/types.h"
 
@@ -23,124 +34,118 @@ QX_API FFTPlan *create_oxfft_table(int32_t length);
 /** Gives a plan back; the last of its holders releases it. Null is allowed. */
 QX_API void destroy_oxfft_table(QX_IN FFTPlan *plan);
 
-/* The one- and two-dimensional transforms. Forward: X[k] = sum over j of x[j] exp(-2 pi i j k / n),
-   unscaled. Inverse: the opposite sign and the factor 1/n. Any length runs without padding.
-
-   A status of the host that refuses an output is returned as it is. Every status but 0 leaves the
-   output empty.
-
-   With `shift` non-zero a spectrum is in shifted order: index j holds frequency (j - n/2) modulo
-   n, so that the zero frequency stands at n/2.
-
-   An export keeps its plan from call to call in a slot: a word of the caller's, null at first, of
-   which the host is told so that it can clean up. An _IDP export keeps it in the host's instance
-   data, which TransformUnreserveProc gives back, and is otherwise its twin. */
-
-/** CxOXFFTH80 of the whole input, not shifted. */
+/** As CxOXFFTH80, of the whole input, not shifted. */
 QX_API ErrorCode CxOXFFTH(QX_IN CDB1D in, QX_OUT CDB1D out, QX_INOUT PlanSlot *slot);
 
-/** The transform of the `size` values of `in` from `offset` on, with zeros behind its end; `out`
-    gets `size` values. The offset is not checked: it must not be negative.
+/** The transform X[k] = sum over j of x[j] exp(-2 pi i j k / n), k from 0 to n-1, unscaled, of the
+    n = `size` values x of `in` from `offset` on, with zeros behind its end; `out` gets X, in
+    shifted order if `shift` is non-zero. The offset is not checked: it must not be negative.
     Codes: ErrEmptyInput (in is empty), ErrFFTSizeNotPositive (size below 1), ErrOutOfMemory (no
     memory), the host's status. */
 QX_API ErrorCode CxOXFFTH80(QX_IN CDB1D in, QX_OUT CDB1D out, QX_INOUT PlanSlot *slot,
                             int32_t offset, int32_t size, int32_t shift);
-/** CxOXFFTH80 with its plan in the host's instance data. */
+/** As CxOXFFTH80, with its plan in the host's instance data. */
 QX_API ErrorCode CxOXFFTH80_IDP(QX_IN CDB1D in, QX_OUT CDB1D out, QX_INOUT InstanceWord *instance,
                                 int32_t offset, int32_t size, int32_t shift);
 
-/** InvCxOXFFTH80 of a spectrum that is not shifted. */
+/** As InvCxOXFFTH80, of a spectrum that is not shifted. */
 QX_API ErrorCode InvCxOXFFTH(QX_IN CDB1D in, QX_OUT CDB1D out, QX_INOUT PlanSlot *slot);
 
-/** The inverse transform of `in`; `out` gets as many values.
+/** The inverse transform x[j] = 1/n sum over k of X[k] exp(2 pi i j k / n) of the n values X of
+    `in`, which is in shifted order if `shift` is non-zero; `out` gets as many values.
     Codes: ErrEmptyInput (in is empty), ErrOutOfMemory (no memory), the host's status. */
 QX_API ErrorCode InvCxOXFFTH80(QX_IN CDB1D in, QX_OUT CDB1D out, QX_INOUT PlanSlot *slot,
                                int32_t shift);
-/** InvCxOXFFTH80 with its plan in the host's instance data. */
+/** As InvCxOXFFTH80, with its plan in the host's instance data. */
 QX_API ErrorCode InvCxOXFFTH80_IDP(QX_IN CDB1D in, QX_OUT CDB1D out,
                                    QX_INOUT InstanceWord *instance, int32_t shift);
 
-/** ReOXFFTH80 of the whole input, not shifted. */
+/** As ReOXFFTH80, of the whole input, not shifted. */
 QX_API ErrorCode ReOXFFTH(QX_IN DBL1D in, QX_OUT CDB1D out, QX_INOUT PlanSlot *slot);
 
-/** The transform of the `size` values of real data from `offset` on, with zeros behind its end;
-    `out` gets all `size` values of the spectrum.
+/** The transform X[k] = sum over j of x[j] exp(-2 pi i j k / n), unscaled, of the n = `size` values
+    x of real data from `offset` on, with zeros behind its end; `out` gets X for all k from 0 to
+    n-1, in shifted order if `shift` is non-zero.
     Codes: ErrEmptyInput (in is empty), ErrIndexOutOfRange (offset outside the input),
     ErrFFTSizeNotPositive (size below 1), ErrOutOfMemory (no memory), the host's status. */
 QX_API ErrorCode ReOXFFTH80(QX_IN DBL1D in, QX_OUT CDB1D out, QX_INOUT PlanSlot *slot,
                             int32_t offset, int32_t size, int32_t shift);
-/** ReOXFFTH80 with its plan in the host's instance data. */
+/** As ReOXFFTH80, with its plan in the host's instance data. */
 QX_API ErrorCode ReOXFFTH80_IDP(QX_IN DBL1D in, QX_OUT CDB1D out, QX_INOUT InstanceWord *instance,
                                 int32_t offset, int32_t size, int32_t shift);
 
-/** The transform of real data in half-complex form: out[0] = Re X[0]; out[k] = Re X[k] and out[n-k]
-    = Im X[k] for k from 1 to (n-1)/2; for even n out[n/2] = Re X[n/2].
+/** The transform X[k] = sum over j of x[j] exp(-2 pi i j k / n) of real data, unscaled, in
+    half-complex form: out[0] = Re X[0]; out[k] = Re X[k] and out[n-k] = Im X[k] for k from 1 to
+    (n-1)/2; for even n out[n/2] = Re X[n/2].
     Codes: ErrEmptyInput (in is empty), the host's status, ErrOutOfMemory (no memory). */
 QX_API ErrorCode ReOXFFTHCH(QX_IN DBL1D in, QX_OUT DBL1D out, QX_INOUT PlanSlot *slot);
-/** ReOXFFTHCH with its plan in the host's instance data. */
+/** As ReOXFFTHCH, with its plan in the host's instance data. */
 QX_API ErrorCode ReOXFFTHCH_IDP(QX_IN DBL1D in, QX_OUT DBL1D out, QX_INOUT InstanceWord *instance);
 
-/** InvReOXFFTH80 of a spectrum that is not shifted. */
+/** As InvReOXFFTH80, of a spectrum that is not shifted. */
 QX_API ErrorCode InvReOXFFTH(QX_IN CDB1D in, QX_OUT DBL1D out, QX_INOUT PlanSlot *slot);
 
-/** The inverse transform of the spectrum of real data. Only the non-negative frequencies are read,
-    and of zero and n/2 only the real part: the output is real whatever the rest holds.
+/** The inverse transform x[j] = 1/n sum over k of X[k] exp(2 pi i j k / n) of the spectrum of real
+    data, which is in shifted order if `shift` is non-zero. Only the non-negative frequencies are
+    read, and of zero and n/2 only the real part: the output is real whatever the rest holds.
     Codes: ErrEmptyInput (in is empty), ErrOutOfMemory (no memory), the host's status. */
 QX_API ErrorCode InvReOXFFTH80(QX_IN CDB1D in, QX_OUT DBL1D out, QX_INOUT PlanSlot *slot,
                                int32_t shift);
-/** InvReOXFFTH80 with its plan in the host's instance data. */
+/** As InvReOXFFTH80, with its plan in the host's instance data. */
 QX_API ErrorCode InvReOXFFTH80_IDP(QX_IN CDB1D in, QX_OUT DBL1D out,
                                    QX_INOUT InstanceWord *instance, int32_t shift);
 
-/** The inverse transform of a half-complex spectrum. `in` serves as work memory: it is left scaled
-    by 1/n and turned into the Hartley form.
+/** The inverse of ReOXFFTHCH, with the factor 1/n, of a half-complex spectrum. `in` serves as work
+    memory: it is left scaled by 1/n and turned into the Hartley form.
     Codes: ErrEmptyInput (in is empty), the host's status, ErrOutOfMemory (no memory). */
 QX_API ErrorCode InvReOXFFTHCH(QX_INOUT DBL1D in, QX_OUT DBL1D out, QX_INOUT PlanSlot *slot);
-/** InvReOXFFTHCH with its plan in the host's instance data. */
+/** As InvReOXFFTHCH, with its plan in the host's instance data. */
 QX_API ErrorCode InvReOXFFTHCH_IDP(QX_INOUT DBL1D in, QX_OUT DBL1D out,
                                    QX_INOUT InstanceWord *instance);
 
-/** Gives the plans of an _IDP node back and clears its instance-data word. Null is allowed. Always
-    0. */
+/** Gives the plans of an _IDP node back and clears its instance-data word. Null is allowed.
+    Codes: none. */
 QX_API ErrorCode TransformUnreserveProc(QX_INOUT InstanceWord *instance);
 
 /** X[r][c] = sum over a and b of x[a][b] exp(-2 pi i (r a / rows + c b / cols)), with x the rows by
     cols values of `in` from (rowStart, colStart) on, padded with zeros behind its ends; shift
-    concerns both dimensions. slotCols keeps the plan of length cols, slotRows that of length rows.
+    concerns both dimensions. Unscaled. slotCols keeps the plan of length cols, slotRows that of
+    length rows.
     Codes: ErrEmptyInput (in is empty), ErrIndexOutOfRange (a start behind the end),
     ErrSizesDisagree (rows or cols below 1), ErrOutOfMemory (no memory), the host's status,
     ErrIndexOutOfRange (a negative start). */
 QX_API ErrorCode CxFFT2D_H(QX_IN CDB2D in, int32_t rowStart, int32_t colStart, int32_t rows,
                            int32_t cols, int32_t shift, QX_OUT CDB2D out,
                            QX_INOUT PlanSlot *slotCols, QX_INOUT PlanSlot *slotRows);
-/** CxFFT2D_H with its plans in the host's instance data. */
+/** As CxFFT2D_H, with its plans in the host's instance data. */
 QX_API ErrorCode CxFFT2D_H_IDP(QX_IN CDB2D in, int32_t rowStart, int32_t colStart, int32_t rows,
                                int32_t cols, int32_t shift, QX_OUT CDB2D out,
                                QX_INOUT InstanceWord *instance);
 
-/** CxFFT2D_H of a real matrix. */
+/** As CxFFT2D_H, of a real matrix. */
 QX_API ErrorCode ReFFT2D_H(QX_IN DBL2D in, int32_t rowStart, int32_t colStart, int32_t rows,
                            int32_t cols, int32_t shift, QX_OUT CDB2D out,
                            QX_INOUT PlanSlot *slotCols, QX_INOUT PlanSlot *slotRows);
-/** ReFFT2D_H with its plans in the host's instance data. */
+/** As ReFFT2D_H, with its plans in the host's instance data. */
 QX_API ErrorCode ReFFT2D_H_IDP(QX_IN DBL2D in, int32_t rowStart, int32_t colStart, int32_t rows,
                                int32_t cols, int32_t shift, QX_OUT CDB2D out,
                                QX_INOUT InstanceWord *instance);
 
-/** The inverse transform of a matrix, with the factor 1/(rows cols). slotCols keeps the plan of the
-    column count, slotRows that of the row count.
+/** The inverse transform of a rows by cols matrix X, which is in shifted order if `shift` is
+    non-zero: x[a][b] = 1/(rows cols) sum over r and c of X[r][c] exp(2 pi i (r a / rows + c b /
+    cols)). slotCols keeps the plan of the column count, slotRows that of the row count.
     Codes: ErrEmptyInput (in is empty), ErrOutOfMemory (no memory), the host's status. */
 QX_API ErrorCode CxInvFFT2D_H(QX_IN CDB2D in, int32_t shift, QX_OUT CDB2D out,
                               QX_INOUT PlanSlot *slotCols, QX_INOUT PlanSlot *slotRows);
-/** CxInvFFT2D_H with its plans in the host's instance data. */
+/** As CxInvFFT2D_H, with its plans in the host's instance data. */
 QX_API ErrorCode CxInvFFT2D_H_IDP(QX_IN CDB2D in, int32_t shift, QX_OUT CDB2D out,
                                   QX_INOUT InstanceWord *instance);
 
-/** CxInvFFT2D_H of the spectrum of a real matrix: rows of negative row frequency are not read. The
-    codes of CxInvFFT2D_H. */
+/** As CxInvFFT2D_H, of the spectrum of a real matrix: rows of negative row frequency are not
+    read. */
 QX_API ErrorCode ReInvFFT2D_H(QX_IN CDB2D in, int32_t shift, QX_OUT DBL2D out,
                               QX_INOUT PlanSlot *slotCols, QX_INOUT PlanSlot *slotRows);
-/** ReInvFFT2D_H with its plans in the host's instance data. */
+/** As ReInvFFT2D_H, with its plans in the host's instance data. */
 QX_API ErrorCode ReInvFFT2D_H_IDP(QX_IN CDB2D in, int32_t shift, QX_OUT DBL2D out,
                                   QX_INOUT InstanceWord *instance);
 

@@ -69,7 +69,7 @@ QX_API void QX_ParabolicCylinder(double x, double v, QX_OUT DBL *value);
     descending transformation (17.6.8). NaN for m outside [0, 1]. */
 QX_API void QX_Elliptic1(double m, double phi, QX_OUT DBL *value);
 
-/** The same with a selector for what a NaN says above: 1 complete, otherwise incomplete. */
+/** As QX_Elliptic1, with a selector for what a NaN says there: 1 complete, otherwise incomplete. */
 QX_API void QX_Elliptic1_85(double m, double phi, QX_OUT DBL *value, int32_t selector);
 
 /** Elliptic integral of the second kind: complete, E(m), where phi is NaN, else E(phi, m), the
@@ -77,7 +77,7 @@ QX_API void QX_Elliptic1_85(double m, double phi, QX_OUT DBL *value, int32_t sel
     1]. */
 QX_API void QX_Elliptic2(double m, double phi, QX_OUT DBL *value);
 
-/** The same with a selector for what a NaN says above: 1 complete, otherwise incomplete. */
+/** As QX_Elliptic2, with a selector for what a NaN says there: 1 complete, otherwise incomplete. */
 QX_API void QX_Elliptic2_85(double m, double phi, QX_OUT DBL *value, int32_t selector);
 
 /** Jacobian elliptic functions sn = sin(phi), cn = cos(phi), dn = (1 - m sn^2)^(1/2) of u with

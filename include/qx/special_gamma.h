@@ -16,7 +16,7 @@ QX_BEGIN_DECLS
     [0, 1] or an argument that is not finite. */
 QX_API void QX_Beta(double a, double b, double x, QX_OUT DBL *value);
 
-/** QX_Beta with a selector for what a NaN says there: 1 complete, otherwise I_x(a, b). */
+/** As QX_Beta, with a selector for what a NaN says there: 1 complete, otherwise I_x(a, b). */
 QX_API void QX_Beta_85(double a, double b, double x, QX_OUT DBL *value, int32_t selector);
 
 /** n factorial: a table up to 33, correctly rounded products up to 50, gamma(n + 1) beyond. NaN
@@ -34,7 +34,7 @@ QX_API void QX_LnFact(int32_t n, QX_OUT DBL *value);
  */
 QX_API void QX_Gamma(double a, double x, QX_OUT DBL *value);
 
-/** QX_Gamma with a selector for what a NaN says there: 1 complete, otherwise P(a, x). */
+/** As QX_Gamma, with a selector for what a NaN says there: 1 complete, otherwise P(a, x). */
 QX_API void QX_Gamma_85(double a, double x, QX_OUT DBL *value, int32_t selector);
 
 /** Regularised upper incomplete gamma function Q(a, x) = 1 - P(a, x): 1 at x = 0, 0 at

@@ -27,9 +27,9 @@ QX_BEGIN_DECLS
     arises within them they give NaN. */
 QX_API void QX_Gauss(double x, double a, double b, double c, QX_OUT DBL *value);
 
-/** The same function, with Pfaff's transformation for all x < 0.2, where its argument lies in
-    [-0.25, 0.5]; the form to prefer. On [-0.5, 0.2) it may differ from QX_Gauss in the last
-    digits, elsewhere the two are equal. */
+/** As QX_Gauss, with Pfaff's transformation for all x < 0.2, where its argument lies in [-0.25,
+    0.5]; the form to prefer. On [-0.5, 0.2) it may differ from QX_Gauss in the last digits,
+    elsewhere the two are equal. */
 QX_API void QX_Gauss_2011(double x, double a, double b, double c, QX_OUT DBL *value);
 
 /** Kummer's confluent hypergeometric function M(a, b, x) = 1F1, the sum of (a)_k / ((b)_k k!) x^k.

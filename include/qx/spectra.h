@@ -14,25 +14,25 @@ QX_BEGIN_DECLS
     transform. The sum of S is the mean square of x; S[k] equals S[n-k] to the bit.
     Codes: ErrEmptyInput (x is empty), ErrOutOfMemory (no memory). A failure empties x. */
 QX_API ErrorCode SpectrumH(QX_INOUT DBL1D x, QX_INOUT PlanSlot *slot);
-/** SpectrumH with its plan in the host's instance data. */
+/** As SpectrumH, with its plan in the host's instance data. */
 QX_API ErrorCode SpectrumH_IDP(QX_INOUT DBL1D x, QX_INOUT InstanceWord *instance);
 
 /** The power spectrum of complex data: spectrum[k] = |X[k]|^2 / n^2, n values.
-    Codes: ErrEmptyInput (x is empty), ErrOutOfMemory (no memory, or the host refuses the output).
- */
+    Codes: ErrEmptyInput (x is empty), ErrOutOfMemory (no memory, or the host refuses the
+    output). */
 QX_API ErrorCode CxSpectrumH(QX_IN CDB1D x, QX_OUT DBL1D spectrum, QX_INOUT PlanSlot *slot);
-/** CxSpectrumH with its plan in the host's instance data. */
+/** As CxSpectrumH, with its plan in the host's instance data. */
 QX_API ErrorCode CxSpectrumH_IDP(QX_IN CDB1D x, QX_OUT DBL1D spectrum,
                                  QX_INOUT InstanceWord *instance);
 
 /** The cross spectrum: cross[k] = conj(X[k]) Y[k] / n^2, n values. Element 0 and, for even n,
     element n/2 have the imaginary part zero; element n-k is the conjugate of element k to the bit.
-    Codes: ErrEmptyInput (x or y is empty), ErrSizeMismatch (their sizes differ), the host's own
-    status where it refuses the output (a positive one leaves the output as it is), ErrOutOfMemory
-    (no memory). */
+    Codes: ErrEmptyInput (x or y is empty), ErrSizeMismatch (their sizes differ), the host's status
+    (it refuses the output; a positive one leaves the output as it is), ErrOutOfMemory (no
+    memory). */
 QX_API ErrorCode CrossSpectrumH(QX_IN DBL1D x, QX_IN DBL1D y, QX_OUT CDB1D cross,
                                 QX_INOUT PlanSlot *slot);
-/** CrossSpectrumH with its plan in the host's instance data. */
+/** As CrossSpectrumH, with its plan in the host's instance data. */
 QX_API ErrorCode CrossSpectrumH_IDP(QX_IN DBL1D x, QX_IN DBL1D y, QX_OUT CDB1D cross,
                                     QX_INOUT InstanceWord *instance);
 
@@ -41,7 +41,7 @@ QX_API ErrorCode CrossSpectrumH_IDP(QX_IN DBL1D x, QX_IN DBL1D y, QX_OUT CDB1D c
     (the host refuses the output, or no memory). */
 QX_API ErrorCode CxCrossSpectrumH(QX_IN CDB1D x, QX_IN CDB1D y, QX_OUT CDB1D cross,
                                   QX_INOUT PlanSlot *slot);
-/** CxCrossSpectrumH with its plan in the host's instance data. */
+/** As CxCrossSpectrumH, with its plan in the host's instance data. */
 QX_API ErrorCode CxCrossSpectrumH_IDP(QX_IN CDB1D x, QX_IN CDB1D y, QX_OUT CDB1D cross,
                                       QX_INOUT InstanceWord *instance);
 

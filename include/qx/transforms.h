@@ -17,7 +17,7 @@ QX_BEGIN_DECLS
     Codes: ErrEmptyInput (in is empty), the host's status, ErrOutOfMemory (no memory). Every failure
     empties out. */
 QX_API ErrorCode DCT_1DH(QX_IN DBL1D in, QX_OUT DBL1D out, int32_t size, QX_INOUT PlanSlot *slot);
-/** DCT_1DH with its plan in the host's instance data. */
+/** As DCT_1DH, with its plan in the host's instance data. */
 QX_API ErrorCode DCT_1DH_IDP(QX_IN DBL1D in, QX_OUT DBL1D out, int32_t size,
                              QX_INOUT InstanceWord *instance);
 
@@ -26,7 +26,7 @@ QX_API ErrorCode DCT_1DH_IDP(QX_IN DBL1D in, QX_OUT DBL1D out, int32_t size,
     Codes: ErrEmptyInput (in is empty), the host's status, ErrOutOfMemory (no memory). Every failure
     empties out. */
 QX_API ErrorCode DST_1DH(QX_IN DBL1D in, QX_OUT DBL1D out, int32_t size, QX_INOUT PlanSlot *slot);
-/** DST_1DH with its plan in the host's instance data. */
+/** As DST_1DH, with its plan in the host's instance data. */
 QX_API ErrorCode DST_1DH_IDP(QX_IN DBL1D in, QX_OUT DBL1D out, int32_t size,
                              QX_INOUT InstanceWord *instance);
 
@@ -35,73 +35,76 @@ QX_API ErrorCode DST_1DH_IDP(QX_IN DBL1D in, QX_OUT DBL1D out, int32_t size,
     Every failure empties out. Without work memory the result is 0 and out, of full size, is not
     written. */
 QX_API ErrorCode InvDCT_1DH(QX_IN DBL1D in, QX_OUT DBL1D out, QX_INOUT PlanSlot *slot);
-/** InvDCT_1DH with its plan in the host's instance data. */
+/** As InvDCT_1DH, with its plan in the host's instance data. */
 QX_API ErrorCode InvDCT_1DH_IDP(QX_IN DBL1D in, QX_OUT DBL1D out, QX_INOUT InstanceWord *instance);
 
 /** The inverse of DST_1DH: x[j] = 2/(n+1) sum over k of X[k] sin(pi (j+1) (k+1) / (n+1)).
     Codes: ErrEmptyInput (in is empty), the host's status, ErrOutOfMemory (no memory). Every failure
     empties out. */
 QX_API ErrorCode InvDST_1DH(QX_IN DBL1D in, QX_OUT DBL1D out, QX_INOUT PlanSlot *slot);
-/** InvDST_1DH with its plan in the host's instance data. */
+/** As InvDST_1DH, with its plan in the host's instance data. */
 QX_API ErrorCode InvDST_1DH_IDP(QX_IN DBL1D in, QX_OUT DBL1D out, QX_INOUT InstanceWord *instance);
 
-/** DCT_1DH of all rows, then of all columns, of the upper left rows by cols values (those of the
-    input where below 1; zeros beyond it). slotA keeps the plan of the columns, slotB that of the
-    rows.
+/** As DCT_1DH, of all rows, then of all columns, of the upper left rows by cols values (those of
+    the input where below 1; zeros beyond it). slotA keeps the plan of the columns, slotB that of
+    the rows.
     Codes: ErrEmptyInput (in is empty), ErrOutOfMemory (no memory), the host's status. Every failure
     empties out. */
 QX_API ErrorCode DCT_2DH(QX_IN DBL2D in, QX_OUT DBL2D out, int32_t rows, int32_t cols,
                          QX_INOUT PlanSlot *slotA, QX_INOUT PlanSlot *slotB);
-/** DCT_2DH with its plans in the host's instance data. */
+/** As DCT_2DH, with its plans in the host's instance data. */
 QX_API ErrorCode DCT_2DH_IDP(QX_IN DBL2D in, QX_OUT DBL2D out, int32_t rows, int32_t cols,
                              QX_INOUT InstanceWord *instance);
 
-/** DST_1DH of all rows, then of all columns; sizes and slots as in DCT_2DH.
+/** As DST_1DH, of all rows, then of all columns; sizes and slots as in DCT_2DH.
     Codes: ErrEmptyInput (in is empty), ErrOutOfMemory (no memory), the host's status. Every failure
     empties out. */
 QX_API ErrorCode DST_2DH(QX_IN DBL2D in, QX_OUT DBL2D out, int32_t rows, int32_t cols,
                          QX_INOUT PlanSlot *slotA, QX_INOUT PlanSlot *slotB);
-/** DST_2DH with its plans in the host's instance data. */
+/** As DST_2DH, with its plans in the host's instance data. */
 QX_API ErrorCode DST_2DH_IDP(QX_IN DBL2D in, QX_OUT DBL2D out, int32_t rows, int32_t cols,
                              QX_INOUT InstanceWord *instance);
 
-/** The inverse of DCT_2DH on the whole input, columns first. Codes of DCT_2DH. */
+/** The inverse of DCT_2DH on the whole input, columns first.
+    Codes: those of DCT_2DH. */
 QX_API ErrorCode InvDCT_2DH(QX_IN DBL2D in, QX_OUT DBL2D out, QX_INOUT PlanSlot *slotA,
                             QX_INOUT PlanSlot *slotB);
-/** InvDCT_2DH with its plans in the host's instance data. */
+/** As InvDCT_2DH, with its plans in the host's instance data. */
 QX_API ErrorCode InvDCT_2DH_IDP(QX_IN DBL2D in, QX_OUT DBL2D out, QX_INOUT InstanceWord *instance);
 
-/** The inverse of DST_2DH on the whole input, rows first. Codes of DST_2DH. */
+/** The inverse of DST_2DH on the whole input, rows first.
+    Codes: those of DST_2DH. */
 QX_API ErrorCode InvDST_2DH(QX_IN DBL2D in, QX_OUT DBL2D out, QX_INOUT PlanSlot *slotA,
                             QX_INOUT PlanSlot *slotB);
-/** InvDST_2DH with its plans in the host's instance data. */
+/** As InvDST_2DH, with its plans in the host's instance data. */
 QX_API ErrorCode InvDST_2DH_IDP(QX_IN DBL2D in, QX_OUT DBL2D out, QX_INOUT InstanceWord *instance);
 
 /** Replaces x by its Hartley transform: H[k] = sum over j of x[j] (cos(2 pi j k / n) + sin(2 pi j k
     / n)), unscaled.
     Codes: ErrEmptyInput (x is empty), ErrOutOfMemory (no memory). A failure empties x. */
 QX_API ErrorCode FHTH(QX_INOUT DBL1D x, QX_INOUT PlanSlot *slot);
-/** FHTH with its plan in the host's instance data. */
+/** As FHTH, with its plan in the host's instance data. */
 QX_API ErrorCode FHTH_IDP(QX_INOUT DBL1D x, QX_INOUT InstanceWord *instance);
 
 /** The inverse of FHTH: the same transform with the factor 1/n.
     Codes: ErrEmptyInput (x is empty), ErrOutOfMemory (no memory). A failure empties x, but where no
     plan can be had x stays as it is. */
 QX_API ErrorCode InvFHTH(QX_INOUT DBL1D x, QX_INOUT PlanSlot *slot);
-/** InvFHTH with its plan in the host's instance data. */
+/** As InvFHTH, with its plan in the host's instance data. */
 QX_API ErrorCode InvFHTH_IDP(QX_INOUT DBL1D x, QX_INOUT InstanceWord *instance);
 
 /** Replaces x by its Hilbert transform: the spectrum times -i for positive and i for negative
     frequencies, 0 at the zero and the Nyquist frequency. A cosine becomes a sine.
     Codes: ErrEmptyInput (x is empty), ErrOutOfMemory (no memory). A failure empties x. */
 QX_API ErrorCode FastHilbertTransformH(QX_INOUT DBL1D x, QX_INOUT PlanSlot *slot);
-/** FastHilbertTransformH with its plan in the host's instance data. */
+/** As FastHilbertTransformH, with its plan in the host's instance data. */
 QX_API ErrorCode FastHilbertTransformH_IDP(QX_INOUT DBL1D x, QX_INOUT InstanceWord *instance);
 
 /** The negative of FastHilbertTransformH, which returns x less its mean and, for even n, less its
-    Nyquist part. Codes of FastHilbertTransformH. */
+    Nyquist part.
+    Codes: those of FastHilbertTransformH. */
 QX_API ErrorCode InvFastHilbertTransformH(QX_INOUT DBL1D x, QX_INOUT PlanSlot *slot);
-/** InvFastHilbertTransformH with its plan in the host's instance data. */
+/** As InvFastHilbertTransformH, with its plan in the host's instance data. */
 QX_API ErrorCode InvFastHilbertTransformH_IDP(QX_INOUT DBL1D x, QX_INOUT InstanceWord *instance);
 
 /** A band of bins of a transform of length L = S N from S transforms of length N: out[i] = sum over
@@ -113,14 +116,14 @@ QX_API ErrorCode InvFastHilbertTransformH_IDP(QX_INOUT DBL1D x, QX_INOUT Instanc
     negative status empties out. An empty input gives an empty output and 0. */
 QX_API ErrorCode ReDZTH(QX_INOUT DBL1D in, int32_t S, int32_t N, int32_t start, int32_t size,
                         QX_OUT CDB1D out, QX_INOUT PlanSlot *slot);
-/** ReDZTH with its plan in the host's instance data. */
+/** As ReDZTH, with its plan in the host's instance data. */
 QX_API ErrorCode ReDZTH_IDP(QX_INOUT DBL1D in, int32_t S, int32_t N, int32_t start, int32_t size,
                             QX_OUT CDB1D out, QX_INOUT InstanceWord *instance);
 
-/** ReDZTH of complex data. */
+/** As ReDZTH, of complex data. */
 QX_API ErrorCode CxDZTH(QX_INOUT CDB1D in, int32_t S, int32_t N, int32_t start, int32_t size,
                         QX_OUT CDB1D out, QX_INOUT PlanSlot *slot);
-/** CxDZTH with its plan in the host's instance data. */
+/** As CxDZTH, with its plan in the host's instance data. */
 QX_API ErrorCode CxDZTH_IDP(QX_INOUT CDB1D in, int32_t S, int32_t N, int32_t start, int32_t size,
                             QX_OUT CDB1D out, QX_INOUT InstanceWord *instance);
 

@@ -25,8 +25,7 @@
    F. J. Harris, "On the use of windows for harmonic analysis with the discrete Fourier
    transform", 1978, defines most of them.
 
-   Any failure empties the array. -20001 (no scratch memory or no plan) can come last from every
-   export here. */
+   Any failure empties the array. */
 
 #include "qx/types.h"
 
@@ -41,147 +40,158 @@ typedef struct WindowConstants {
 /** Kaiser window: I0(beta sqrt(1 - u^2)) / I0(beta) with u = 1 - 2i/n. The Bessel series stops
     after 25 terms, so a large beta is cut short. J. F. Kaiser, "Nonrecursive digital filter design
     using the I0-sinh window function", 1974.
-    -20003 x is empty. */
+    Codes: ErrEmptyInput (x is empty). */
 QX_API ErrorCode KaiserH(QX_INOUT DBL1D x, double beta);
-/** KaiserH for complex samples. */
+/** As KaiserH, for complex samples. */
 QX_API ErrorCode CxKaiserH(QX_INOUT CDB1D x, double beta);
 
 /** Dolph-Chebyshev window with side lobes `ratio` (linear) below the main lobe and a peak of 1;
     symmetric if `symmetric` is non-zero, else periodic. C. L. Dolph, "A current distribution for
     broadside arrays which optimizes the relationship between beam width and side-lobe level", 1946.
-    -20003 x is empty. A ratio below 1 gives NaN. */
+    Codes: ErrEmptyInput (x is empty), ErrOutOfMemory (no scratch memory or no plan). A ratio below
+    1 gives NaN. */
 QX_API ErrorCode DolChebyWinH(QX_INOUT DBL1D x, double ratio, int32_t symmetric);
-/** DolChebyWinH for complex samples. */
+/** As DolChebyWinH, for complex samples. */
 QX_API ErrorCode CxDolChebyWinH(QX_INOUT CDB1D x, double ratio, int32_t symmetric);
 
 /** Gaussian window exp(-t^2 / (2 sigma^2)): t = (i - n/2) / (n + 1), or (i - (n-1)/2) / n if
     `symmetric` is non-zero. A sigma of 0 or less counts as 0.2.
-    -20003 x is empty. */
+    Codes: ErrEmptyInput (x is empty). */
 QX_API ErrorCode GaussWinH(QX_INOUT DBL1D x, double sigma, int32_t symmetric);
-/** GaussWinH for complex samples. */
+/** As GaussWinH, for complex samples. */
 QX_API ErrorCode CxGaussWinH(QX_INOUT CDB1D x, double sigma, int32_t symmetric);
 
 /** Force window: keeps the first `percent` per cent of the samples and sets the rest to 0.
-    -20006 x has fewer than 2 samples. */
+    Codes: ErrFewerThanTwo (x has fewer than 2 samples). */
 QX_API ErrorCode ForceWinH(QX_INOUT DBL1D x, double percent);
-/** ForceWinH for complex samples. */
+/** As ForceWinH, for complex samples. */
 QX_API ErrorCode CxForceWinH(QX_INOUT CDB1D x, double percent);
 
 /** Exponential window, from 1 at the first to `finalValue` at the last sample.
-    -20006 x has fewer than 2 samples, -20027 the final value is not above 0. */
+    Codes: ErrFewerThanTwo (x has fewer than 2 samples), ErrFinalValueNotPositive (the final value
+    is not above 0). */
 QX_API ErrorCode ExpWinH(QX_INOUT DBL1D x, double finalValue);
-/** ExpWinH for complex samples. */
+/** As ExpWinH, for complex samples. */
 QX_API ErrorCode CxExpWinH(QX_INOUT CDB1D x, double finalValue);
 
 /** Cosine tapered window: sin^2 tapers over `taperRatio` of the samples, half at each end, in
     symmetric form. A ratio of 1 or more gives the Hanning window, in periodic form; one of 0 or
     less leaves x as it is.
-    -20003 x is empty. */
+    Codes: ErrEmptyInput (x is empty). */
 QX_API ErrorCode CosTaperedH(QX_INOUT DBL1D x, double taperRatio);
-/** CosTaperedH for complex samples. */
+/** As CosTaperedH, for complex samples. */
 QX_API ErrorCode CxCosTaperedH(QX_INOUT CDB1D x, double taperRatio);
 
 /** Triangle window 2i/n up to the middle. A single sample becomes 0.
-    -20003 x is empty. */
+    Codes: ErrEmptyInput (x is empty). */
 QX_API ErrorCode TriangleWinH(QX_INOUT DBL1D x);
-/** TriangleWinH for complex samples. */
+/** As TriangleWinH, for complex samples. */
 QX_API ErrorCode CxTriangleWinH(QX_INOUT CDB1D x);
 
 /** Welch window 1 - ((i - n/2) / (n/2))^2.
-    -20003 x is empty. */
+    Codes: ErrEmptyInput (x is empty). */
 QX_API ErrorCode WelchWinH(QX_INOUT DBL1D x);
-/** WelchWinH for complex samples. */
+/** As WelchWinH, for complex samples. */
 QX_API ErrorCode CxWelchWinH(QX_INOUT CDB1D x);
 
 /** Bartlett-Hanning window 0.62 - 0.48 |i/n - 1/2| - 0.38 cos(2 pi i / n).
-    -20003 x is empty. */
+    Codes: ErrEmptyInput (x is empty). */
 QX_API ErrorCode BartHannWinH(QX_INOUT DBL1D x);
-/** BartHannWinH for complex samples. */
+/** As BartHannWinH, for complex samples. */
 QX_API ErrorCode CxBartHannWinH(QX_INOUT CDB1D x);
 
 /** Bohman window sin(theta)/pi - (2i/n) cos(theta), theta = 2 pi i / n, up to the middle.
-    -20003 x is empty. */
+    Codes: ErrEmptyInput (x is empty). */
 QX_API ErrorCode BohmanWinH(QX_INOUT DBL1D x);
-/** BohmanWinH for complex samples. */
+/** As BohmanWinH, for complex samples. */
 QX_API ErrorCode CxBohmanWinH(QX_INOUT CDB1D x);
 
 /** Parzen window: with t = |i - n/2| / (n/2), 1 - 6 t^2 + 6 t^3 for t up to 1/2, 2 (1 - t)^3
     beyond.
-    -20003 x is empty. */
+    Codes: ErrEmptyInput (x is empty). */
 QX_API ErrorCode ParzenWinH(QX_INOUT DBL1D x);
-/** ParzenWinH for complex samples. */
+/** As ParzenWinH, for complex samples. */
 QX_API ErrorCode CxParzenWinH(QX_INOUT CDB1D x);
 
 /** Cosine sum with the coefficients a = `coefs`: sum over k of (-1)^k a[k] cos(2 pi k i / n).
-    -20003 x is empty, or coefs is empty and x has more than one sample. */
+    Codes: ErrEmptyInput (x is empty, or coefs is empty and x has more than one sample),
+    ErrOutOfMemory (no scratch memory). */
 QX_API ErrorCode GenCosWinH(QX_INOUT DBL1D x, QX_IN DBL1D coefs);
-/** GenCosWinH for complex samples. */
+/** As GenCosWinH, for complex samples. */
 QX_API ErrorCode CxGenCosWinH(QX_INOUT CDB1D x, QX_IN DBL1D coefs);
 
 /** The cosine sum of GenCosWinH divided by its coherent gain, coefs[0].
-    -20003 x is empty, or coefs is empty and x has more than one sample. */
+    Codes: ErrEmptyInput (x is empty, or coefs is empty and x has more than one sample),
+    ErrOutOfMemory (no scratch memory). */
 QX_API ErrorCode ScaledGenCosWinH(QX_INOUT DBL1D x, QX_IN DBL1D coefs);
-/** ScaledGenCosWinH for complex samples. */
+/** As ScaledGenCosWinH, for complex samples. */
 QX_API ErrorCode ScaledCxGenCosWinH(QX_INOUT CDB1D x, QX_IN DBL1D coefs);
 
 /** The cosine sums, selectors 0 to 9 and 11; divided by the coherent gain if `scaled` is non-zero.
-    -20003 x is empty, -20061 another selector. */
+    Codes: ErrEmptyInput (x is empty), ErrInvalidSelector (another selector), ErrOutOfMemory (no
+    scratch memory). */
 QX_API ErrorCode AllCosWinH(QX_INOUT DBL1D x, int32_t selector, int32_t scaled);
-/** AllCosWinH for complex samples. */
+/** As AllCosWinH, for complex samples. */
 QX_API ErrorCode CxAllCosWinH(QX_INOUT CDB1D x, int32_t selector, int32_t scaled);
 
-/** Any window that has a symmetric form: selectors 0 to 9, 11, 30 to 34, 60 to 62. The parameter
-    is used as it stands; that of selector 61 is a linear ratio.
-    -20003 x is empty, -20061 another selector (unless x has a single sample). */
+/** Any window that has a symmetric form: selectors 0 to 9, 11, 30 to 34, 60 to 62. The parameter is
+    used as it stands; that of selector 61 is a linear ratio.
+    Codes: ErrEmptyInput (x is empty), ErrInvalidSelector (another selector (unless x has a single
+    sample)), ErrOutOfMemory (no scratch memory or no plan). */
 QX_API ErrorCode SymmWinH(QX_INOUT DBL1D x, int32_t selector, double param);
-/** SymmWinH for complex samples. */
+/** As SymmWinH, for complex samples. */
 QX_API ErrorCode CxSymmWinH(QX_INOUT CDB1D x, int32_t selector, double param);
 
-/** A window divided by its coherent gain: selectors 0 to 9, 11, 30 to 34, 60 to 62. `constants`
-    are those of the window before the division, NaN after a failure; for cosine sums they are
-    stored values, so x may be empty there. The parameter is used as it stands; that of selector 61
-    is a linear ratio.
-    -20061 another selector, -20003 x is empty. */
+/** A window divided by its coherent gain: selectors 0 to 9, 11, 30 to 34, 60 to 62. `constants` are
+    those of the window before the division, NaN after a failure; for cosine sums they are stored
+    values, so x may be empty there. The parameter is used as it stands; that of selector 61 is a
+    linear ratio.
+    Codes: ErrInvalidSelector (another selector), ErrEmptyInput (x is empty), ErrOutOfMemory (no
+    scratch memory or no plan). */
 QX_API ErrorCode ScaledWinH(QX_INOUT DBL1D x, int32_t selector, double param,
                             QX_OUT WindowConstants *constants);
-/** ScaledWinH for complex samples. */
+/** As ScaledWinH, for complex samples. */
 QX_API ErrorCode CxScaledWinH(QX_INOUT CDB1D x, int32_t selector, double param,
                               QX_OUT WindowConstants *constants);
 
 /** Any window in any form: divided by its coherent gain if `scaled` is non-zero, symmetric if
     `symmetric` is non-zero. A NaN as parameter, for selectors 61 and 62 also a negative one, means
     the default; that of selector 61 is in decibels.
-    -20061 both forms at once or an unknown selector, -20003 x is empty, then as the exports of the
-    windows. */
+    Codes: ErrInvalidSelector (both forms at once or an unknown selector), ErrEmptyInput (x is
+    empty), ErrFewerThanTwo (force or exponential with fewer than 2 samples),
+    ErrFinalValueNotPositive (exponential with a final value that is not above 0), ErrOutOfMemory
+    (no scratch memory or no plan). */
 QX_API ErrorCode AllWinH(QX_INOUT DBL1D x, int32_t selector, double param, int32_t scaled,
                          int32_t symmetric);
-/** AllWinH for complex samples. */
+/** As AllWinH, for complex samples. */
 QX_API ErrorCode CxAllWinH(QX_INOUT CDB1D x, int32_t selector, double param, int32_t scaled,
                            int32_t symmetric);
 
-/** KaiserH with its code in *err; the function result is 0. */
+/** As KaiserH, with its code in *err; the function result is 0. */
 QX_API int32_t Kaiser_Bessel(QX_INOUT DBL1D x, QX_IN const DBL *beta, QX_OUT ErrorCode *err);
-/** ForceWinH with its code in *err; the function result is 0. */
+/** As ForceWinH, with its code in *err; the function result is 0. */
 QX_API int32_t ForceWindCIN(QX_INOUT DBL1D x, QX_IN const DBL *percent, QX_OUT ErrorCode *err);
-/** ExpWinH with its code in *err; the function result is 0. */
+/** As ExpWinH, with its code in *err; the function result is 0. */
 QX_API int32_t ExpWindCIN(QX_INOUT DBL1D x, QX_IN const DBL *finalValue, QX_OUT ErrorCode *err);
-/** TriangleWinH with its code in *err; the function result is 0. */
+/** As TriangleWinH, with its code in *err; the function result is 0. */
 QX_API int32_t TriangleWin(QX_INOUT DBL1D x, QX_OUT ErrorCode *err);
-/** CosTaperedH with a taper ratio of 0.2 and its code in *err; the function result is 0. */
+/** As CosTaperedH, with a taper ratio of 0.2 and its code in *err; the function result is 0. */
 QX_API int32_t CosTapered(QX_INOUT DBL1D x, QX_OUT ErrorCode *err);
 
 /** The constants of the window held in an array, measured in one pass.
-    -20003 window is empty; both constants are then NaN. */
+    Codes: ErrEmptyInput (window is empty). Both constants are then NaN. */
 QX_API ErrorCode NumWinConstH(QX_IN DBL1D window, QX_OUT WindowConstants *constants);
 /** The constants of a named window of n samples: stored values for selectors 0 to 9 and 11,
-    measured ones for 30 to 34 and 60 to 62. The parameter is used as it stands; that of selector
-    61 is a linear ratio.
-    -20003 n is below 1, -20061 another selector; both constants are then NaN. */
+    measured ones for 30 to 34 and 60 to 62. The parameter is used as it stands; that of selector 61
+    is a linear ratio.
+    Codes: ErrEmptyInput (n is below 1), ErrInvalidSelector (another selector), ErrOutOfMemory (no
+    scratch memory or no plan). Both constants are then NaN. */
 QX_API ErrorCode WinConstByNameH(int32_t n, int32_t selector, double param,
                                  QX_OUT WindowConstants *constants);
-/** WinConstByNameH with the parameter taken as AllWinH takes it: a NaN, for selectors 61 and 62
+/** As WinConstByNameH, with the parameter taken as AllWinH takes it: a NaN, for selectors 61 and 62
     also a negative value, means the default, and that of selector 61 is in decibels.
-    -20003 n is below 1, -20061 another selector; both constants are then NaN. */
+    Codes: ErrEmptyInput (n is below 1), ErrInvalidSelector (another selector), ErrOutOfMemory (no
+    scratch memory or no plan). Both constants are then NaN. */
 QX_API ErrorCode WinConstByNameH_2016(int32_t n, int32_t selector, double param,
                                       QX_OUT WindowConstants *constants);
 

@@ -210,6 +210,11 @@ class Catalogue(unittest.TestCase):
         self.assertEqual(code, 0)
         for part in ('moment = qx.call("Moment_head", x, order)', "-20021  ErrOrderNotPositive", "qx/stats.h"):
             self.assertIn(part, out)
+        # What a twin takes over from others comes with it, and so does the header's introduction.
+        code, out, _ = run("show", "InvCxOXFFTH")
+        for part in ("As InvCxOXFFTH80, of", "InvCxOXFFTH80: The inverse transform x[j] = 1/n sum",
+                     "-20003  ErrEmptyInput", "Fourier transforms of any length"):
+            self.assertIn(part, out)
         for arguments in (["show", "Moment"], ["list", "no-such"]):
             code, _, err = run(*arguments)
             self.assertEqual((code, err.count("\n")), (2, 1))

@@ -7,7 +7,9 @@
 #include <algorithm>
 #include <cctype>
 #include <fstream>
+#include <map>
 #include <set>
+#include <sstream>
 #include <string>
 #include <thread>
 
@@ -25,6 +27,33 @@ struct Result {
     int32_t reshapes;
 };
 
+// What the headers say of an export's codes.
+struct Documented {
+    bool hostStatus = false;
+    std::set<ErrorCode> codes = {0};
+};
+
+// By name; exports without a status are not among them.
+const std::map<std::string, Documented> &DocumentedCodes() {
+    static const auto all = [] {
+        std::map<std::string, Documented> exports;
+        std::ifstream file(QX_CODE_LIST);
+        for (std::string line; std::getline(file, line);) {
+            std::istringstream words(line);
+            std::string word;
+            words >> word;
+            Documented &documented = exports[word];
+            while (words >> word)
+                if (word == "host")
+                    documented.hostStatus = true;
+                else
+                    documented.codes.insert(std::stoi(word));
+        }
+        return exports;
+    }();
+    return all;
+}
+
 class Conformance : public testing::TestWithParam<Recipe> {
 protected:
     static bool has(Quirk quirk) { return (GetParam().quirks & quirk) != 0; }
@@ -36,6 +65,7 @@ protected:
     // Calls, and holds the function result to the export's convention.
     static ErrorCode statusOf(Call &call, int32_t refusal = 0) {
         const int32_t result = GetParam().run(call);
+        const HeapProbe::Pause pause;
         const ErrorCode status = call.status(result);
         if (call.hasErr()) {
             EXPECT_EQ(result, has(CodeInBoth)           ? status
@@ -43,7 +73,17 @@ protected:
                                                         : 0)
                 << "the function result beside *err";
         }
+        expectDocumented(status, refusal);
         return status;
+    }
+    static void expectDocumented(ErrorCode status, int32_t refusal) {
+        const auto found = DocumentedCodes().find(GetParam().exportName());
+        if (found == DocumentedCodes().end())
+            EXPECT_EQ(status, 0) << "of an export that has none by its declaration";
+        else if (refusal != 0 && status == refusal)
+            EXPECT_TRUE(found->second.hostStatus) << "the host's status is not under Codes:";
+        else
+            EXPECT_TRUE(found->second.codes.count(status)) << status << " is not under Codes:";
     }
     static Result run(int32_t n) {
         Call call(n);
@@ -153,7 +193,7 @@ TEST_P(Conformance, AFailedAllocationIsACodeAndLeaksNothing) {
         Call call(n);
         ResetHost();
         const HeapProbe probe;
-        const ErrorCode status = call.status(GetParam().run(call));
+        const ErrorCode status = statusOf(call);
         allocations = probe.allocations();
         hash = call.outputHash(status);
     }
@@ -165,7 +205,7 @@ TEST_P(Conformance, AFailedAllocationIsACodeAndLeaksNothing) {
         ErrorCode status = 0;
         {
             const HeapProbe probe(k);
-            status = call.status(GetParam().run(call));
+            status = statusOf(call);
             call.releaseNodes();
             live = probe.liveAllocations();
         }
@@ -189,7 +229,7 @@ TEST_P(Conformance, TheWorkspaceChangesNoBitAndSparesTheHeap) {
         ErrorCode status = 0;
         {
             const HeapProbe probe;
-            status = call.status(GetParam().run(call));
+            status = statusOf(call);
             allocations = probe.allocations();
         }
         EXPECT_EQ(call.outputHash(status), onHeap.hash);

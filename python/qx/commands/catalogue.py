@@ -32,10 +32,16 @@ def show_export(options):
     from ..calls import export
     from ..library import library
     entry = export(options.name).entry
+    entries, families = library().entries, library().catalogue["families"]
     print(textwrap.fill(entry["declaration"], 96, subsequent_indent="    "))
-    print(f"    C header qx/{entry['family']}.h")
+    print(f"    C header {entry['header']}")
     print(f"    Python   {export(options.name).signature()}\n")
     print(entry["documentation"])
+    for name in entry["inherited"]:
+        print(f"\n{name}: {entries[name]['documentation']}")
+    introduction = next(f["introduction"] for f in families if f["name"] == entry["family"])
+    if introduction:
+        print(f"\nAll of {entry['header']}\n{introduction}")
     if entry["codes"]:
         print("\nMessages")
         for name in entry["codes"]:
