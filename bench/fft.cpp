@@ -79,11 +79,19 @@ private:
 };
 
 struct Totals {
-    Ratios complexEstimate{"complex, over FFTW estimate"};
-    Ratios complexMeasure{"complex, over FFTW measure"};
-    Ratios realEstimate{"real, over FFTW r2c estimate"};
-    Ratios realMeasure{"real, over FFTW r2c measure"};
-    Ratios realComplex{"real, over our complex"};
+    Ratios complexEstimate{"complex transform, estimate"};
+    Ratios complexMeasure{"complex transform, measure"};
+    Ratios realEstimate{"real transform, estimate"};
+    Ratios realMeasure{"real transform, measure"};
+    Ratios realComplex{"real transform"};
+
+    void summary() const {
+        complexEstimate.summary("FFTW, FFTW_ESTIMATE");
+        complexMeasure.summary("FFTW, FFTW_MEASURE");
+        realEstimate.summary("FFTW r2c, FFTW_ESTIMATE");
+        realMeasure.summary("FFTW r2c, FFTW_MEASURE");
+        realComplex.summary("our complex transform");
+    }
 
     void print(const char *group) const {
         std::printf("-- %s\n", group);
@@ -97,6 +105,7 @@ struct Totals {
 void Compare(int32_t n, bool cold, Totals &group, Totals &all) {
     constexpr std::size_t coldBytes = std::size_t{1} << 27;
     const std::size_t copies = cold ? std::max<std::size_t>(2, coldBytes / (32 * n)) : 1;
+    const std::string name = std::to_string(n) + (cold ? ", out of cache" : "");
     double oursTimes[2];
     double ratios[2][2] = {};
     for (const bool real : {false, true}) {
@@ -106,8 +115,8 @@ void Compare(int32_t n, bool cold, Totals &group, Totals &all) {
         const Peer measure(n, real, FFTW_MEASURE, copies);
         const auto times = MedianTimes(ours, estimate, measure);
         for (Totals *totals : {&group, &all}) {
-            (real ? totals->realEstimate : totals->complexEstimate).add(times[0] / times[1]);
-            (real ? totals->realMeasure : totals->complexMeasure).add(times[0] / times[2]);
+            (real ? totals->realEstimate : totals->complexEstimate).add(times[0] / times[1], name);
+            (real ? totals->realMeasure : totals->complexMeasure).add(times[0] / times[2], name);
         }
         ratios[real][0] = times[0] / times[1];
         ratios[real][1] = times[0] / times[2];
@@ -117,11 +126,11 @@ void Compare(int32_t n, bool cold, Totals &group, Totals &all) {
         oursTimes[real] = times[0];
     }
     for (Totals *totals : {&group, &all})
-        totals->realComplex.add(oursTimes[1] / oursTimes[0]);
-    std::printf("%8d complex %10.3f us %5.2f %5.2f   real %10.3f us %5.2f %5.2f   real/complex "
-                "%4.2f\n",
-                n, oursTimes[0] * 1e6, ratios[0][0], ratios[0][1], oursTimes[1] * 1e6, ratios[1][0],
-                ratios[1][1], oursTimes[1] / oursTimes[0]);
+        totals->realComplex.add(oursTimes[1] / oursTimes[0], name);
+    std::printf("%8d complex %10.3f us %s %s   real %10.3f us %s %s   real/complex %4.2f\n", n,
+                oursTimes[0] * 1e6, Cell(ratios[0][0]).c_str(), Cell(ratios[0][1]).c_str(),
+                oursTimes[1] * 1e6, Cell(ratios[1][0]).c_str(), Cell(ratios[1][1]).c_str(),
+                oursTimes[1] / oursTimes[0]);
     std::fflush(stdout);
 }
 
@@ -188,5 +197,5 @@ int main(int argc, char **argv) {
     }
     if (wanted("plan"))
         ReportPlans();
-    all.print("all");
+    all.summary();
 }

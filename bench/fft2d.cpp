@@ -39,8 +39,9 @@ void Compare(int32_t rows, int32_t cols, bool real, const Ours &ours,
     const FFTWPlan estimate = Peer(rows, cols, real, FFTW_ESTIMATE);
     const FFTWPlan measure = Peer(rows, cols, real, FFTW_MEASURE);
     const auto times = MedianTimes(ours, estimate, measure);
-    totals.estimate.add(times[0] / times[1]);
-    totals.measure.add(times[0] / times[2]);
+    const std::string name = std::to_string(rows) + " x " + std::to_string(cols);
+    totals.estimate.add(times[0] / times[1], name);
+    totals.measure.add(times[0] / times[2], name);
     std::printf("%12.2f us %5.2f %5.2f\n", times[0] * 1e6, times[0] / times[1],
                 times[0] / times[2]);
 #else
@@ -52,9 +53,8 @@ void Compare(int32_t rows, int32_t cols, bool real, const Ours &ours,
 } // namespace
 
 int main() {
-    Totals complex{Ratios("2-D complex, over FFTW estimate"),
-                   Ratios("2-D complex, over FFTW measure")};
-    Totals real{Ratios("2-D real, over FFTW estimate"), Ratios("2-D real, over FFTW measure")};
+    Totals complex{Ratios("complex, two dimensions"), Ratios("complex, two dimensions")};
+    Totals real{Ratios("real, two dimensions"), Ratios("real, two dimensions")};
     std::printf("time of ours; ratios to FFTW with FFTW_ESTIMATE and FFTW_MEASURE\n");
     for (const auto &[rows, cols] : {std::pair{64, 64},
                                      {128, 128},
@@ -86,7 +86,7 @@ int main() {
             real);
     }
     for (const Totals *totals : {&complex, &real}) {
-        totals->estimate.print();
-        totals->measure.print();
+        totals->estimate.summary("FFTW, FFTW_ESTIMATE");
+        totals->measure.summary("FFTW, FFTW_MEASURE");
     }
 }

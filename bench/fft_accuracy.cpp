@@ -1,6 +1,6 @@
-// The error of the transforms, beside that of FFTW on the same data, as the table of src/fft/README.md.
-// The reference is a transform in long double, 11 bits more precise than double: of mixed radix for
-// small factors, by Bluestein's algorithm for large ones.
+// The error of the transforms, beside that of FFTW on the same data, as the table of
+// src/fft/README.md. The reference is a transform in long double, 11 bits more precise than double:
+// of mixed radix for small factors, by Bluestein's algorithm for large ones.
 
 #include "fft/plan.h"
 

@@ -97,7 +97,7 @@ void Compare(int threads, Ratios &all) {
         const double ratio = Median(ours) / Median(peers);
         std::printf("scratch, %d thread%s, runs of %d, %5d bytes %8.1f ns  ratio %5.2f\n", threads,
                     threads > 1 ? "s" : " ", Depth, size, Median(ours) * 1e9, ratio);
-        all.add(ratio);
+        all.add(ratio, "runs of " + std::to_string(Depth) + ", " + std::to_string(size) + " bytes");
     }
 }
 
@@ -130,7 +130,7 @@ int main() {
         Ratios all("scratch, " + std::to_string(threads) + " threads");
         Compare<1>(threads, all);
         Compare<8>(threads, all);
-        all.print();
+        all.summary("malloc and free");
     }
     std::printf("requests refused by the full region: %lld\n",
                 static_cast<long long>(refused.load()));

@@ -58,8 +58,6 @@ int main(int argc, char **argv) {
     const char *wanted = argc > 1 ? argv[1] : "";
 #ifdef QX_PEER_GSL
     gsl_set_error_handler_off();
-#else
-    std::puts("GSL is not installed: apt-get install libgsl-dev");
 #endif
     const std::pair<const char *, std::vector<SpecialRow>> groups[] = {
         {"Bessel functions and their kin", qx::bench::SpecialBesselRows()},
@@ -68,7 +66,6 @@ int main(int argc, char **argv) {
         {"error function, integrals", qx::bench::SpecialIntegralsRows()},
     };
     std::vector<qx::bench::Ratios> ratios;
-    qx::bench::Ratios overall("all");
     for (const auto &[name, rows] : groups) {
         ratios.emplace_back(name);
         for (const SpecialRow &row : rows) {
@@ -85,15 +82,11 @@ int main(int argc, char **argv) {
                 fastest = std::min(fastest, times[k]);
             }
             std::puts("");
-            if (times.size() > 1) {
-                ratios.back().add(times[0] / fastest);
-                overall.add(times[0] / fastest);
-            }
+            if (times.size() > 1)
+                ratios.back().add(times[0] / fastest, row.name);
         }
     }
-    std::puts("ours / fastest peer");
     for (const auto &group : ratios)
-        group.print();
-    overall.print();
+        group.summary("the fastest of GSL, C++ library and Boost");
     return 0;
 }

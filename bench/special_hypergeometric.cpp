@@ -6,8 +6,7 @@
 #ifdef QX_PEER_GSL
 #include <gsl/gsl_sf_hyperg.h>
 #endif
-#if __has_include(<boost/math/special_functions/hypergeometric_1F1.hpp>)
-#define QX_PEER_BOOST
+#ifdef QX_PEER_BOOST
 #include <boost/math/special_functions/hypergeometric_1F1.hpp>
 #endif
 

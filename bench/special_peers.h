@@ -10,9 +10,6 @@
 #ifdef QX_PEER_GSL
 #include <gsl/gsl_sf.h>
 #endif
-#if __has_include(<boost/math/special_functions/bessel.hpp>)
-#define QX_PEER_BOOST
-#endif
 
 #define QX_CALL(expression)                                                                        \
     [](double a, double b) -> double {                                                             \

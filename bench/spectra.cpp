@@ -39,7 +39,7 @@ void Compare(int32_t n, Ratios &ratios) {
         },
         refill);
     const double ratio = (times[0] - times[2]) / (times[1] - times[2]);
-    ratios.add(ratio);
+    ratios.add(ratio, std::to_string(n));
     std::printf("%8d power spectrum %10.3f us, over the bare transform %5.2f\n", n,
                 (times[0] - times[2]) * 1e6, ratio);
     std::fflush(stdout);
@@ -48,9 +48,9 @@ void Compare(int32_t n, Ratios &ratios) {
 } // namespace
 
 int main() {
-    Ratios ratios("power spectrum, over the bare transform");
+    Ratios ratios("power spectrum");
     for (int32_t n : {257, 300, 512, 1000, 1024, 1009, 2048, 4096, 10000, 16384, 65536, 100000,
                       262144, 1000000, 1048576})
         Compare(n, ratios);
-    ratios.print();
+    ratios.summary("our bare real transform");
 }

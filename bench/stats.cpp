@@ -65,7 +65,7 @@ const Kind kinds[] = {
 };
 
 template <class Ours, class Peer>
-void CompareOnAllKinds(const char *name, const Ours &ours, const Peer &peer) {
+void CompareOnAllKinds(const char *name, const char *peerName, const Ours &ours, const Peer &peer) {
     Ratios all(name);
     for (const Kind &kind : kinds) {
         Ratios ratios(std::string(name) + ", " + kind.name);
@@ -80,12 +80,12 @@ void CompareOnAllKinds(const char *name, const Ours &ours, const Peer &peer) {
             std::printf("%-8s %-18s n %9d %12.3f us  ratio %5.2f\n", name, kind.name, n,
                         ourTime * 1e6, ourTime / peerTime);
             std::fflush(stdout);
-            ratios.add(ourTime / peerTime);
-            all.add(ourTime / peerTime);
+            ratios.add(ourTime / peerTime, std::to_string(n));
+            all.add(ourTime / peerTime, std::string(kind.name) + ", n " + std::to_string(n));
         }
         ratios.print();
     }
-    all.print();
+    all.summary(peerName);
 }
 
 void CopyTo(double *to, const double *from, int32_t n) {
@@ -94,7 +94,7 @@ void CopyTo(double *to, const double *from, int32_t n) {
 
 void Sort() {
     CompareOnAllKinds(
-        "sort",
+        "sort", "std::sort on a copy",
         [](const double *x, int32_t n, double *work) {
             qx::SortAscending(x, n, 0, work);
             Keep(work[0]);
@@ -109,7 +109,7 @@ void Sort() {
 // The peer does what a median needs and no more: a copy of its own, but no look for NaN.
 void Median() {
     CompareOnAllKinds(
-        "median",
+        "median", "std::nth_element on a copy",
         [](const double *x, int32_t n, double *) {
             double median;
             qx::ArrayMedian(x, n, &median);
@@ -139,7 +139,7 @@ void AdditionChain(int32_t n, double term) {
 }
 
 void Sums() {
-    Ratios ratios("sums against their latency limit");
+    Ratios ratios("sums in a stated order");
     for (const int32_t n : {1000, 3000, 30000, 1000000, 10000000}) {
         const Pool x(n, Random);
         const Pool y(n + 1, Random);
@@ -164,9 +164,9 @@ void Sums() {
                     n, times[0] / n * 1e9, times[1] / times[0], times[2] / times[0],
                     times[3] / times[0]);
         for (int i = 1; i < 4; ++i)
-            ratios.add(times[i] / times[0]);
+            ratios.add(times[i] / times[0], std::to_string(n));
     }
-    ratios.print();
+    ratios.summary("latency of as many additions");
 }
 
 } // namespace

@@ -1,6 +1,8 @@
 #ifndef QX_BENCH_TIMING_H
 #define QX_BENCH_TIMING_H
 
+#include "frame/widths.h"
+
 #include <algorithm>
 #include <array>
 #include <chrono>
@@ -10,8 +12,22 @@
 #include <string>
 #include <vector>
 
-// Times as medians of interleaved runs: every contestant runs once in each round, so that what
-// disturbs the machine disturbs all of them alike.
+// What every benchmark uses.
+//
+// MedianTimes times contestants as medians of interleaved runs: each runs once in each round, so
+// that what disturbs the machine disturbs all of them alike.
+//
+// Ratios collects ours/peer over the cases of a group, each with its name:
+//
+//     Ratios over("DCT, even lengths");
+//     over.add(ours / theirs, "n 1024");
+//     over.print();                      // a line for the reader of the run
+//     over.summary("FFTW, estimate");    // the family's closing line, against whom
+//
+// A program prints one summary for each peer (or kind of task), at its end. bench/run --all
+// collects them in docs/speed.md. A peer that is not installed is told by the summary of empty
+// Ratios, so call it in any case; bench/run names the package. A cell without a peer is printed by
+// Cell.
 
 namespace qx::bench {
 
@@ -59,26 +75,54 @@ std::array<double, sizeof...(Work)> MedianTimes(const Work &...contestants) {
     return medians;
 }
 
-// The ratios ours/peer of one group of rows, with their geometric mean and the worst of them.
+inline const char *WidthInUse() { return lanesInUse == 4 ? "AVX2" : "SSE2"; }
+
+#ifdef __clang__
+inline constexpr char compiler[] = "clang++ " __clang_version__;
+#else
+inline constexpr char compiler[] = "g++ " __VERSION__;
+#endif
+
+// A ratio in a table; there is none (0) where the peer is missing.
+inline std::string Cell(double ratio) {
+    char text[16];
+    std::snprintf(text, sizeof text, "%5.2f", ratio);
+    return ratio > 0 ? text : "    -";
+}
+
+// The ratios ours/peer of one group of cases, with their geometric mean and the worst of them.
 class Ratios {
 public:
     explicit Ratios(std::string name) : name_(std::move(name)) {}
-    void add(double ratio) {
+    void add(double ratio, const std::string &case_ = "") {
         logarithms_ += std::log(ratio);
-        worst_ = std::max(worst_, ratio);
         ++count_;
+        if (ratio > worst_) {
+            worst_ = ratio;
+            worstCase_ = case_;
+        }
     }
     double mean() const { return count_ > 0 ? std::exp(logarithms_ / count_) : 0; }
     void print() const {
         if (count_ > 0)
-            std::printf("%-44s geometric mean %5.2f  worst %5.2f  (%d)\n", name_.c_str(), mean(),
-                        worst_, count_);
+            std::printf("%-44s geometric mean %5.2f  worst %5.2f %s (%d)\n", name_.c_str(), mean(),
+                        worst_, worstCase_.c_str(), count_);
+    }
+    void summary(const std::string &peer) const {
+        std::printf("summary | %s | %s | ", name_.c_str(), peer.c_str());
+        if (count_ > 0)
+            std::printf("%.2f | %.2f | %s | %d", mean(), worst_, worstCase_.c_str(), count_);
+        else
+            std::printf("missing | | | 0");
+        std::printf(" | %s | %s\n", WidthInUse(), compiler);
+        std::fflush(stdout);
     }
 
 private:
     std::string name_;
     double logarithms_ = 0;
     double worst_ = 0;
+    std::string worstCase_;
     int count_ = 0;
 };
 

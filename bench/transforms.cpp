@@ -28,9 +28,9 @@ FFTWPlan Peer(int32_t n, fftw_r2r_kind kind, unsigned effort) {
 #endif
 
 struct Totals {
-    Ratios forwardEstimate{"DCT, over FFTW estimate"};
-    Ratios forwardMeasure{"DCT, over FFTW measure"};
-    Ratios inverseMeasure{"inverse DCT, over FFTW measure"};
+    Ratios forwardEstimate{"cosine transform"};
+    Ratios forwardMeasure{"cosine transform"};
+    Ratios inverseMeasure{"inverse cosine transform"};
 };
 
 void Compare(int32_t n, [[maybe_unused]] Totals &totals) {
@@ -50,9 +50,10 @@ void Compare(int32_t n, [[maybe_unused]] Totals &totals) {
     const FFTWPlan inverseMeasure = Peer(n, FFTW_REDFT01, FFTW_MEASURE);
     const auto times = MedianTimes(forward, estimate, measure);
     const auto inverseTimes = MedianTimes(inverse, inverseMeasure);
-    totals.forwardEstimate.add(times[0] / times[1]);
-    totals.forwardMeasure.add(times[0] / times[2]);
-    totals.inverseMeasure.add(inverseTimes[0] / inverseTimes[1]);
+    const std::string name = std::to_string(n);
+    totals.forwardEstimate.add(times[0] / times[1], name);
+    totals.forwardMeasure.add(times[0] / times[2], name);
+    totals.inverseMeasure.add(inverseTimes[0] / inverseTimes[1], name);
     std::printf("%8d DCT %10.3f us %5.2f %5.2f   inverse %10.3f us %5.2f\n", n, times[0] * 1e6,
                 times[0] / times[1], times[0] / times[2], inverseTimes[0] * 1e6,
                 inverseTimes[0] / inverseTimes[1]);
@@ -77,7 +78,7 @@ int main(int argc, char **argv) {
     std::printf("time of ours; ratios to FFTW with FFTW_ESTIMATE and FFTW_MEASURE\n");
     for (const int32_t n : lengths)
         Compare(n, totals);
-    totals.forwardEstimate.print();
-    totals.forwardMeasure.print();
-    totals.inverseMeasure.print();
+    totals.forwardEstimate.summary("FFTW, FFTW_ESTIMATE");
+    totals.forwardMeasure.summary("FFTW, FFTW_MEASURE");
+    totals.inverseMeasure.summary("FFTW, FFTW_MEASURE");
 }

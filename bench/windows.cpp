@@ -31,7 +31,7 @@ int main() {
         int32_t selector;
     };
     std::printf("%-32s %10s %12s %8s\n", "window", "samples", "ours ns", "ratio");
-    qx::bench::Ratios all("cosine sums / one cosine per term");
+    qx::bench::Ratios all("cosine-sum windows");
     for (const Window &window : {Window{"Hanning", 1},
                                  {"Blackman", 5},
                                  {"Blackman-Harris 4", 7},
@@ -47,8 +47,8 @@ int main() {
                 },
                 [&] { OneCosinePerTerm(x.data(), n, coefs); });
             std::printf("%-32s %10d %12.0f %8.3f\n", window.name, n, ours * 1e9, ours / plain);
-            all.add(ours / plain);
+            all.add(ours / plain, std::string(window.name) + ", n " + std::to_string(n));
         }
-    all.print();
+    all.summary("one cosine per term and sample");
     return 0;
 }

@@ -14,6 +14,7 @@ import numpy as np
 
 sys.path.insert(0, str(Path(__file__).resolve().parent.parent / "python"))
 import qx  # noqa: E402
+from summary import print_summary  # noqa: E402
 
 try:
     from scipy.signal import windows
@@ -39,16 +40,16 @@ def seconds(function, repeats, rounds):
 
 
 def main():
-    logarithms = []
+    ratios = []
     for n in (10**3, 10**4, 10**5, 10**6, 10**7):
         x = np.random.default_rng(n).normal(size=n)
         repeats, rounds = max(1, 100_000 // n), 7 if n < 10**7 else 3
         for name, selector, parameter, window, arguments in CASES:
             ours = seconds(lambda: qx.call("AllWinH", x, selector, parameter, 0, 0), repeats, rounds)
             theirs = seconds(lambda: x * window(n, *arguments, False), repeats, rounds)
-            logarithms.append(math.log(ours / theirs))
+            ratios.append((ours / theirs, f"{name}, n {n}"))
             print(f"{name:26} n {n:>8}  {1e6 * ours:11.1f} us   {ours / theirs:5.2f}")
-    print(f"geometric mean {math.exp(sum(logarithms) / len(logarithms)):.2f}")
+    print_summary("windows from Python", "SciPy", ratios)
 
 
 if __name__ == "__main__":

@@ -1,0 +1,55 @@
+#!/usr/bin/python3
+"""speed_page.py LOG: the page docs/speed.md from what all benchmarks have printed."""
+
+import datetime
+import os
+import platform
+import subprocess
+import sys
+from pathlib import Path
+
+HEAD = """# Speed
+
+Written by `bench/run --all`. Each row is a geometric mean of the ratios time of ours / time of the
+peer, one thread, plans and the like made outside the timed loop; below 1 is faster than the peer.
+Medians of interleaved runs.
+"""
+
+
+def machine():
+    """What the figures were measured on."""
+    facts = dict(line.split(":", 1) for line in
+                 subprocess.run(["lscpu"], capture_output=True, text=True,
+                                check=True).stdout.splitlines() if ":" in line)
+    caches = ", ".join(f"{name} {facts[name + ' cache'].strip()}" for name in ("L1d", "L2", "L3")
+                       if name + " cache" in facts)
+    return (f"{facts['Model name'].strip()} (family {facts['CPU family'].strip()}, model "
+            f"{facts['Model'].strip()}), {os.cpu_count()} processors, {caches}; "
+            f"{platform.system()} {platform.release()}, {datetime.date.today().isoformat()}")
+
+
+def main():
+    family, rows, builds, absent = None, [], set(), []
+    for line in Path(sys.argv[1]).read_text().splitlines():
+        if line.startswith("== "):
+            family = line[3:]
+        elif line.startswith("missing peer: "):
+            absent.append(f"- `{family}`: {line.removeprefix('missing peer: ')}")
+        elif line.startswith("summary | "):
+            what, peer, mean, worst, case, count, width, compiler = [
+                cell.strip() for cell in line.split(" |")[1:]]
+            builds.add((width, compiler))
+            rows.append(f"| {family} | {what} | {peer} | {mean} | {worst} | {case} | {count} |")
+    print(HEAD)
+    print(f"Machine: {machine()}.\n")
+    for width, compiler in sorted(builds):
+        print(f"Width {width}, {compiler}.\n")
+    print("| Family | What | Peer | Mean | Worst | At | Cases |\n|---|---|---|---|---|---|---|")
+    print("\n".join(rows))
+    if absent:
+        print("\nPeers that were not installed:\n")
+        print("\n".join(absent))
+
+
+if __name__ == "__main__":
+    main()

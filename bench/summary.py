@@ -1,0 +1,28 @@
+"""The closing line of a benchmark in Python, as bench/timing.h prints it for those in C++."""
+
+import math
+import os
+import re
+import subprocess
+from pathlib import Path
+
+
+def width():
+    wide = "avx2" in Path("/proc/cpuinfo").read_text().split() and os.environ.get("QX_WIDTH") != "2"
+    return "AVX2" if wide else "SSE2"
+
+
+def compiler():
+    """As the module itself tells."""
+    module = Path(os.environ.get("QX_LIBRARY_DIR", "build/release")) / "libqxanalysis.so"
+    comment = subprocess.run(["readelf", "-p", ".comment", module], capture_output=True, text=True)
+    found = re.search(r"(GCC|clang).*?(\d+\.\d+\.\d+)", comment.stdout)
+    return f"{'g++' if found[1] == 'GCC' else 'clang++'} {found[2]}" if found else "unknown compiler"
+
+
+def print_summary(what, peer, ratios):
+    """`ratios`: pairs of ours/peer and the name of the case."""
+    mean = math.exp(sum(math.log(ratio) for ratio, _ in ratios) / len(ratios))
+    worst, case = max(ratios)
+    print(f"summary | {what} | {peer} | {mean:.2f} | {worst:.2f} | {case} | {len(ratios)} | "
+          f"{width()} | {compiler()}")
