@@ -31,6 +31,7 @@ struct HostRecord {
     int32_t failStatus = 0;        // with this status
 };
 HostRecord &Host();
+constexpr int32_t everyReshape = -1; // as `failAt`
 // Forgets the calling thread's record and sets which reshape fails.
 void ResetHost(int32_t failAt = 0, int32_t failStatus = 0);
 
