@@ -8,23 +8,23 @@
 namespace qx {
 
 // The `size` values of an input that a transform reads from `offset` on: the input itself where
-// it reaches far enough, else a scratch copy with zeros behind the input's end. The offset must
-// not be negative.
+// they all lie in it, else a scratch copy with zeros before the input's start and behind its end.
 template <ElementType Code>
 class InputWindow {
 public:
     typedef typename Element<Code>::type T;
 
     ErrorCode take(const T *in, int32_t n, int32_t offset, int32_t size) {
-        const int64_t present = int64_t{n} - offset;
-        if (present >= size) {
+        if (offset >= 0 && int64_t{n} - offset >= size) {
             data_ = in + offset;
             return 0;
         }
         if (const ErrorCode failed = copy_.allocate(size))
             return failed;
-        for (int32_t j = 0; j < size; ++j)
-            copy_[j] = j < present ? in[int64_t{offset} + j] : T{};
+        for (int32_t j = 0; j < size; ++j) {
+            const int64_t i = int64_t{offset} + j;
+            copy_[j] = i >= 0 && i < n ? in[i] : T{};
+        }
         data_ = copy_.data();
         return 0;
     }

@@ -22,13 +22,15 @@ bool IsCertain(double p, double lowerEnd, DBL *quantile) {
     return true;
 }
 
-// The point where the distribution reaches p, from below, within 1e-4.
+// The point where the distribution reaches p, from below, within 1e-4. A NaN probability is
+// reached everywhere, so that the lower end of the bracket remains.
 // kept: the tolerance is absolute for every scale of the answer
 template <class Distribution>
 double Bisect(double p, double lo, double hi, Distribution distribution) {
     do {
         const double mid = (lo + hi) * 0.5;
-        (p <= distribution(mid) ? hi : lo) = mid;
+        const bool isReached = std::isnan(p) || p <= distribution(mid);
+        (isReached ? hi : lo) = mid;
     } while (std::fabs(hi - lo) > 0.0001);
     return lo;
 }

@@ -24,7 +24,7 @@ ErrorCode InverseInterleaved(const FFTPlan *plan, const CDB *in, CDB *out, int32
 template <class Keep>
 Outcome ComplexForward(In<CDB1D> in, Out<CDB1D> out, Keep keep, int32_t offset, int32_t size,
                        int32_t shift) {
-    // kept: the offset is not checked here, in contrast to the real transform.
+    // kept: any offset is taken here, in contrast to the real transform.
     if (const ErrorCode failed =
             FirstFailed({{in.isEmpty(), ErrEmptyInput}, {size < 1, ErrFFTSizeNotPositive}}))
         return failed;

@@ -14,6 +14,8 @@
 
 namespace {
 
+using qx::PlanCell;
+using qx::TransformInstance;
 using qx::test::CDBArray;
 using qx::test::DBLArray;
 using qx::test::Dft;
@@ -32,17 +34,16 @@ using qx::test::RunSweeps;
 using qx::test::SameBits;
 using qx::test::Signal;
 using qx::test::ToLong;
-using qx::PlanCell;
-using qx::TransformInstance;
 
 constexpr double Rounding = 2e-15;
 
-// The `size` values from `offset` on, zeros behind the end, transformed and put in order.
+// The `size` values from `offset` on, zeros where there are none, transformed and put in order.
 template <class Values>
-LongSpectrum Expected(const Values &values, int32_t offset, int32_t size, int32_t shift) {
+LongSpectrum Expected(const Values &values, int64_t offset, int32_t size, int32_t shift) {
     LongSpectrum window(size);
-    for (int32_t j = 0; j < size && offset + j < static_cast<int32_t>(values.size()); ++j)
-        window[j] = ToLong(values[offset + j]);
+    for (int32_t j = 0; j < size; ++j)
+        if (offset + j >= 0 && offset + j < static_cast<int32_t>(values.size()))
+            window[j] = ToLong(values[offset + j]);
     const LongSpectrum plain = Dft(window);
     LongSpectrum ordered = plain;
     for (int32_t j = 0; j < size && shift != 0; ++j)
@@ -82,6 +83,20 @@ TEST(OneDimensional, ForwardWindowsPadsAndShifts) {
             }
     EXPECT_TRUE(SameBits(real.values(), x)) << "the input is only read";
     EXPECT_TRUE(SameBits(complex.values(), z));
+}
+
+TEST(OneDimensional, AWindowOfComplexDataMayLieAnywhere) {
+    const std::vector<CDB> z = RandomComplex(12);
+    const CDBArray complex(z);
+    Node node;
+    for (int32_t offset : {std::numeric_limits<int32_t>::min(), -20, -12, -3, -1, 12, 13,
+                           std::numeric_limits<int32_t>::max()})
+        for (int32_t size : {3, 12, 23}) {
+            SCOPED_TRACE(testing::Message() << size << " from " << offset);
+            CDBArray out;
+            ASSERT_EQ(CxOXFFTH80(complex.handle(), out.handle(), &node.slot, offset, size, 0), 0);
+            EXPECT_LT(MaxError(out.values(), Expected(z, offset, size, 0)), Rounding);
+        }
 }
 
 TEST(OneDimensional, InversesReturnTheInput) {

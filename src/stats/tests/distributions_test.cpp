@@ -147,13 +147,15 @@ TEST(Distributions, EdgesAndCodes) {
     EXPECT_EQ(Call(InvChiSquare_head, 1.0, 1).value, inf);
     EXPECT_EQ(NormalQuantile(0.0).value, -inf);
     EXPECT_EQ(NormalQuantile(1.0).value, inf);
-    // A NaN is no probability outside the range, and no mid point reaches it: the bisection ends
-    // beside the upper end.
+    // A NaN is no probability outside the range, and the bisections end at their lower ends.
     EXPECT_TRUE(std::isnan(NormalQuantile(nan).value));
-    const Outcome upper = Call(InvTdist_head, nan, 3);
-    EXPECT_EQ(upper.err, 0);
-    EXPECT_LT(upper.value, 10000.0);
-    EXPECT_NEAR(upper.value, 10000.0, 1e-4);
+    const auto expectLowerEnd = [](const Outcome &outcome, double lower) {
+        EXPECT_EQ(outcome.err, 0);
+        EXPECT_EQ(outcome.value, lower);
+    };
+    expectLowerEnd(Call(InvTdist_head, nan, 3), -10000.0);
+    expectLowerEnd(Call(InvFDist_head, nan, 3, 4), 1e-6);
+    expectLowerEnd(Call(InvChiSquare_head, nan, 3), 0.0);
 }
 
 } // namespace
