@@ -14,83 +14,76 @@ PrimeFactor PrimeAt(const FFTPlan &plan, int32_t level) {
     return {plan.factors[level], plan.kinds[level], plan.stages[level]};
 }
 
-ErrorCode RunComplexLeaf(const FFTPlan &plan, const DBL *inRe, const DBL *inIm, DBL *outRe,
-                         DBL *outIm, ptrdiff_t inStride, ptrdiff_t outStride, int32_t count) {
-    const int32_t last = plan.factorCount - 1;
-    if (plan.kinds[last] != KernelFactor)
-        return PrimeComplexLeaf(PrimeAt(plan, last), inRe, inIm, outRe, outIm, inStride, outStride,
-                                count);
-    plan.complexLeaf[last](inRe, inIm, outRe, outIm, inStride, outStride, count);
-    return 0;
-}
+// Complex data at any strides, real and imaginary parts in arrays of their own.
+struct ComplexData {
+    const DBL *inRe, *inIm;
+    DBL *outRe, *outIm;
+    ptrdiff_t inStride, outStride;
 
-ErrorCode RunComplexTwiddle(const FFTPlan &plan, int32_t level, DBL *re, DBL *im, ptrdiff_t stride,
-                            int32_t m) {
-    if (plan.kinds[level] != KernelFactor)
-        return PrimeComplexTwiddle(PrimeAt(plan, level), re, im, stride, m);
-    const FFTStage &stage = *plan.stages[level];
-    plan.complexTwiddle[level](re, im, stage.twiddleCos, stage.twiddleSin, stride, m);
-    return 0;
-}
+    // The part that begins `in` inputs and `out` results behind, with every p-th input.
+    ComplexData part(ptrdiff_t in, ptrdiff_t out, ptrdiff_t p) const {
+        return {inRe + in * inStride,    inIm + in * inStride, outRe + out * outStride,
+                outIm + out * outStride, p * inStride,         outStride};
+    }
+    ErrorCode leaf(const FFTPlan &plan, int32_t count) const {
+        const int32_t last = plan.factorCount - 1;
+        if (plan.kinds[last] != KernelFactor)
+            return PrimeComplexLeaf(PrimeAt(plan, last), inRe, inIm, outRe, outIm, inStride,
+                                    outStride, count);
+        plan.complexLeaf[last](inRe, inIm, outRe, outIm, inStride, outStride, count);
+        return 0;
+    }
+    ErrorCode twiddle(const FFTPlan &plan, int32_t level, int32_t m) const {
+        if (plan.kinds[level] != KernelFactor)
+            return PrimeComplexTwiddle(PrimeAt(plan, level), outRe, outIm, outStride, m);
+        const FFTStage &stage = *plan.stages[level];
+        plan.complexTwiddle[level](outRe, outIm, stage.twiddleCos, stage.twiddleSin, outStride, m);
+        return 0;
+    }
+};
+
+struct RealData {
+    const DBL *in;
+    DBL *out;
+    ptrdiff_t inStride, outStride;
+
+    RealData part(ptrdiff_t inputs, ptrdiff_t results, ptrdiff_t p) const {
+        return {in + inputs * inStride, out + results * outStride, p * inStride, outStride};
+    }
+    ErrorCode leaf(const FFTPlan &plan, int32_t count) const {
+        const int32_t last = plan.factorCount - 1;
+        if (plan.kinds[last] != KernelFactor)
+            return PrimeRealLeaf(PrimeAt(plan, last), in, out, inStride, outStride, count);
+        plan.realLeaf[last](in, out, inStride, outStride, count);
+        return 0;
+    }
+    ErrorCode twiddle(const FFTPlan &plan, int32_t level, int32_t m) const {
+        if (plan.kinds[level] != KernelFactor)
+            return PrimeRealTwiddle(PrimeAt(plan, level), out, outStride, m);
+        const FFTStage &stage = *plan.stages[level];
+        if (outStride == 1)
+            stage.kernels->realLanesTwiddle(out, stage, m);
+        else
+            plan.realTwiddle[level](out, stage.twiddleCos, stage.twiddleSin, outStride, m);
+        return 0;
+    }
+};
 
 // The recursion. At level L a transform of n values with the factor p is p transforms of every
 // p-th value, one behind the other, and then the twiddle stage over all of them. The leaf takes the
 // p transforms of the last level but one at once.
-//
-// Complex data is handled here at any strides.
-ErrorCode RecurseComplex(const FFTPlan &plan, int32_t level, int32_t n, const DBL *inRe,
-                         const DBL *inIm, DBL *outRe, DBL *outIm, ptrdiff_t inStride,
-                         ptrdiff_t outStride) {
+template <class Data>
+ErrorCode Recurse(const FFTPlan &plan, int32_t level, int32_t n, const Data &data) {
     const int32_t p = plan.factors[level];
     const int32_t m = n / p;
     ErrorCode status = 0;
     if (level == plan.factorCount - 2) {
-        status = RunComplexLeaf(plan, inRe, inIm, outRe, outIm, inStride, outStride, p);
-    } else {
-        for (ptrdiff_t j = 0; j < p && status >= 0; ++j) {
-            const ptrdiff_t in = j * inStride;
-            const ptrdiff_t out = j * m * outStride;
-            status = RecurseComplex(plan, level + 1, m, inRe + in, inIm + in, outRe + out,
-                                    outIm + out, p * inStride, outStride);
-        }
-    }
-    return status < 0 ? status : RunComplexTwiddle(plan, level, outRe, outIm, outStride, m);
-}
-
-ErrorCode RunRealLeaf(const FFTPlan &plan, const DBL *in, DBL *out, ptrdiff_t inStride,
-                      ptrdiff_t outStride, int32_t count) {
-    const int32_t last = plan.factorCount - 1;
-    if (plan.kinds[last] != KernelFactor)
-        return PrimeRealLeaf(PrimeAt(plan, last), in, out, inStride, outStride, count);
-    plan.realLeaf[last](in, out, inStride, outStride, count);
-    return 0;
-}
-
-ErrorCode RunRealTwiddle(const FFTPlan &plan, int32_t level, DBL *data, ptrdiff_t stride,
-                         int32_t m) {
-    if (plan.kinds[level] != KernelFactor)
-        return PrimeRealTwiddle(PrimeAt(plan, level), data, stride, m);
-    const FFTStage &stage = *plan.stages[level];
-    if (stride == 1)
-        stage.kernels->realLanesTwiddle(data, stage, m);
-    else
-        plan.realTwiddle[level](data, stage.twiddleCos, stage.twiddleSin, stride, m);
-    return 0;
-}
-
-ErrorCode RecurseReal(const FFTPlan &plan, int32_t level, int32_t n, const DBL *in, DBL *out,
-                      ptrdiff_t inStride, ptrdiff_t outStride) {
-    const int32_t p = plan.factors[level];
-    const int32_t m = n / p;
-    ErrorCode status = 0;
-    if (level == plan.factorCount - 2) {
-        status = RunRealLeaf(plan, in, out, inStride, outStride, p);
+        status = data.leaf(plan, p);
     } else {
         for (ptrdiff_t j = 0; j < p && status >= 0; ++j)
-            status = RecurseReal(plan, level + 1, m, in + j * inStride, out + j * m * outStride,
-                                 p * inStride, outStride);
+            status = Recurse(plan, level + 1, m, data.part(j, j * m, p));
     }
-    return status < 0 ? status : RunRealTwiddle(plan, level, out, outStride, m);
+    return status < 0 ? status : data.twiddle(plan, level, m);
 }
 
 // The recursion in SIMD lanes, for results that lie side by side and a leaf with kernels. Several
@@ -124,7 +117,7 @@ struct RealLanesPath {
         kernels.realLanesLeaf(in, out, columns);
     }
     static ErrorCode twiddle(const FFTPlan &plan, int32_t level, DBL *out, int32_t m) {
-        return RunRealTwiddle(plan, level, out, 1, m);
+        return RealData{nullptr, out, 1, 1}.twiddle(plan, level, m);
     }
 };
 
@@ -191,12 +184,13 @@ ErrorCode ExecuteComplex(const FFTPlan &plan, const DBL *inRe, const DBL *inIm, 
         outIm[0] = inIm[0];
         return 0;
     }
+    const ComplexData data{inRe, inIm, outRe, outIm, inStride, outStride};
     if (plan.factorCount == 1)
-        return RunComplexLeaf(plan, inRe, inIm, outRe, outIm, inStride, outStride, 1);
+        return data.leaf(plan, 1);
     if (interleaved && LeafHasKernels(plan))
         return RecurseLanes<ComplexLanesPath>(plan, 0, plan.length, inRe, outRe, inStride,
                                               {1, 0, 0});
-    return RecurseComplex(plan, 0, plan.length, inRe, inIm, outRe, outIm, inStride, outStride);
+    return Recurse(plan, 0, plan.length, data);
 }
 
 ErrorCode ExecuteReal(const FFTPlan &plan, const DBL *in, DBL *out, ptrdiff_t inStride,
@@ -212,11 +206,12 @@ ErrorCode ExecuteReal(const FFTPlan &plan, const DBL *in, DBL *out, ptrdiff_t in
         out[0] = in[0];
         return 0;
     }
+    const RealData data{in, out, inStride, outStride};
     if (plan.factorCount == 1)
-        return RunRealLeaf(plan, in, out, inStride, outStride, 1);
+        return data.leaf(plan, 1);
     if (outStride == 1 && LeafHasKernels(plan))
         return RecurseLanes<RealLanesPath>(plan, 0, plan.length, in, out, inStride, {1, 0, 0});
-    return RecurseReal(plan, 0, plan.length, in, out, inStride, outStride);
+    return Recurse(plan, 0, plan.length, data);
 }
 
 ErrorCode FFTComplexForward(const FFTPlan *plan, const DBL *inRe, const DBL *inIm, DBL *outRe,

@@ -3,6 +3,7 @@
 #include "fft/execute.h"
 #include "fft/factorise.h"
 #include "fft/kernels/kernels.h"
+#include "frame/constants.h"
 #include "frame/elements.h"
 #include "frame/platform.h"
 
@@ -16,8 +17,6 @@ namespace qx {
 namespace {
 
 using std::ptrdiff_t;
-
-constexpr double twoPi = 6.283185307179586;
 
 // The cache: every plan that has a holder, the newest first.
 platform::Mutex cacheMutex;
@@ -76,7 +75,7 @@ bool BuildTwiddles(FFTStage *stage, int32_t p, int32_t n) {
     if (!Allocate(stage->twiddleCos, (m - 1) * int64_t{pitch}) ||
         !Allocate(stage->twiddleSin, (m - 1) * int64_t{pitch}))
         return false;
-    const double step = twoPi / n;
+    const double step = kTwoPi / n;
     for (int32_t j = 1; j < p; ++j) {
         Roots roots(j * step);
         for (ptrdiff_t k = 1; k < m; ++k) {
@@ -102,7 +101,7 @@ bool BuildRoots(FFTStage *stage, int32_t p) {
         return false;
     stage->rootCos[0] = 1.0;
     stage->rootSin[0] = 0.0;
-    Roots roots(twoPi / p);
+    Roots roots(kTwoPi / p);
     for (int32_t k = 1; k < p; ++k) {
         stage->rootCos[k] = roots.re;
         stage->rootSin[k] = roots.im;
@@ -142,7 +141,7 @@ bool BuildRaderSpectrum(FFTStage *stage, int32_t p, int32_t n) {
     if (!Allocate(temporary, 2 * int64_t{n}))
         return false;
     Fill(temporary, 2 * ptrdiff_t{n}, 0.0);
-    Roots roots(twoPi / p);
+    Roots roots(kTwoPi / p);
     for (int32_t t = 0; t < p - 1; ++t) {
         stage->raderCos[t] = roots.re;
         stage->raderSin[t] = roots.im;

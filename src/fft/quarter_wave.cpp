@@ -1,4 +1,5 @@
 #include "fft/quarter_wave.h"
+#include "frame/constants.h"
 
 #include <atomic>
 #include <cmath>
@@ -10,8 +11,6 @@
 namespace qx {
 namespace {
 
-constexpr double Pi = 3.141592653589793;
-
 double *QuarterWaveOf(int32_t length) {
     const int64_t entries = int64_t{length} / 2 + 1;
     if (entries > std::numeric_limits<std::ptrdiff_t>::max() / int64_t{2 * sizeof(double)})
@@ -21,7 +20,7 @@ double *QuarterWaveOf(int32_t length) {
     if (!wave)
         return nullptr;
     for (std::ptrdiff_t k = 0; k < entries; ++k) {
-        const double angle = Pi * static_cast<double>(k) / (2.0 * length);
+        const double angle = kPi * static_cast<double>(k) / (2.0 * length);
         wave[2 * k] = std::cos(angle);
         wave[2 * k + 1] = std::sin(angle);
     }

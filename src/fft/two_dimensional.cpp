@@ -177,13 +177,54 @@ void GatherHalfComplex(const CDB *work, int64_t workPitch, int32_t n, int32_t co
     }
 }
 
-// Runs transform(i) for the columns i of a block in ascending order; the number that came out.
-template <class Transform>
-int32_t ColumnsDone(int32_t count, Transform transform) {
-    for (int32_t i = 0; i < count; ++i)
-        if (transform(i) < 0)
-            return i;
-    return count;
+// What the columns of the two inverses are.
+struct ComplexColumns {
+    static constexpr auto Code = ElementType::CDB;
+    static int32_t rowsUsed(int32_t rows) { return rows; }
+    static constexpr auto gather = GatherColumns<Code>;
+    static ErrorCode inverse(const FFTPlan *plan, CDB *in, CDB *out, int32_t n) {
+        return Inverse(plan, in, out, n);
+    }
+};
+struct RealColumns {
+    static constexpr auto Code = ElementType::DBL;
+    static int32_t rowsUsed(int32_t rows) { return rows / 2 + 1; }
+    static constexpr auto gather = GatherHalfComplex;
+    static ErrorCode inverse(const FFTPlan *plan, DBL *in, DBL *out, int32_t n) {
+        return FFTRealInverse(plan, in, out, 1, 1, n);
+    }
+};
+
+// Rows first, then columns.
+// kept: a failed column ends the loop unreported, and the columns from there on stay unwritten.
+template <class Columns>
+ErrorCode InverseMatrix(const FFTPlan *rowPlan, const FFTPlan *columnPlan, const CDB *in,
+                        int32_t rows, int32_t cols, int32_t shift,
+                        typename Element<Columns::Code>::type *out) {
+    const int64_t pitch = PaddedPitch(rows);
+    const int32_t used = Columns::rowsUsed(rows);
+    ComplexBlock work;
+    HeapBlock<Columns::Code> columns;
+    HeapBlock<Columns::Code> results;
+    if (const ErrorCode failed = work.allocate(used * PaddedPitch(cols)))
+        return failed;
+    if (const ErrorCode failed = columns.allocate(ColumnsAtOnce * pitch))
+        return failed;
+    if (const ErrorCode failed = results.allocate(ColumnsAtOnce * pitch))
+        return failed;
+    if (const ErrorCode failed = InverseRows(rowPlan, in, rows, cols, shift, used, work.data()))
+        return failed;
+    int32_t done = ColumnsAtOnce;
+    for (int32_t c = 0; c < cols && done == ColumnsAtOnce; c += ColumnsAtOnce) {
+        const int32_t count = ColumnsInBlock(c, cols);
+        Columns::gather(work.data() + c, PaddedPitch(cols), rows, count, columns.data(), pitch);
+        done = 0;
+        while (done < count && Columns::inverse(columnPlan, columns.data() + done * pitch,
+                                                results.data() + done * pitch, rows) >= 0)
+            ++done;
+        ScatterColumns<Columns::Code>(results.data(), pitch, rows, done, out + c, cols);
+    }
+    return 0;
 }
 
 } // namespace
@@ -256,63 +297,14 @@ ErrorCode FFT2DRealForward(const FFTPlan *rowPlan, const FFTPlan *columnPlan, co
                           });
 }
 
-// kept: in both inverses a failed column ends the loop unreported, and the columns from there on
-// stay unwritten.
-
 ErrorCode FFT2DComplexInverse(const FFTPlan *rowPlan, const FFTPlan *columnPlan, const CDB *in,
                               int32_t rows, int32_t cols, int32_t shift, CDB *out) {
-    const int64_t pitch = PaddedPitch(rows);
-    ComplexBlock work;
-    ComplexBlock columns;
-    ComplexBlock results;
-    if (const ErrorCode failed = work.allocate(rows * PaddedPitch(cols)))
-        return failed;
-    if (const ErrorCode failed = columns.allocate(ColumnsAtOnce * pitch))
-        return failed;
-    if (const ErrorCode failed = results.allocate(ColumnsAtOnce * pitch))
-        return failed;
-    if (const ErrorCode failed = InverseRows(rowPlan, in, rows, cols, shift, rows, work.data()))
-        return failed;
-    int32_t done = ColumnsAtOnce;
-    for (int32_t c = 0; c < cols && done == ColumnsAtOnce; c += ColumnsAtOnce) {
-        const int32_t count = ColumnsInBlock(c, cols);
-        GatherColumns<ElementType::CDB>(work.data() + c, PaddedPitch(cols), rows, count,
-                                        columns.data(), pitch);
-        done = ColumnsDone(count, [&](int32_t i) {
-            return Inverse(columnPlan, columns.data() + i * pitch, results.data() + i * pitch,
-                           rows);
-        });
-        ScatterColumns<ElementType::CDB>(results.data(), pitch, rows, done, out + c, cols);
-    }
-    return 0;
+    return InverseMatrix<ComplexColumns>(rowPlan, columnPlan, in, rows, cols, shift, out);
 }
 
 ErrorCode FFT2DRealInverse(const FFTPlan *rowPlan, const FFTPlan *columnPlan, const CDB *in,
                            int32_t rows, int32_t cols, int32_t shift, DBL *out) {
-    const int64_t pitch = PaddedPitch(rows);
-    ComplexBlock work;
-    HeapBlock<ElementType::DBL> columns;
-    HeapBlock<ElementType::DBL> results;
-    const int32_t used = rows / 2 + 1;
-    if (const ErrorCode failed = work.allocate(used * PaddedPitch(cols)))
-        return failed;
-    if (const ErrorCode failed = columns.allocate(ColumnsAtOnce * pitch))
-        return failed;
-    if (const ErrorCode failed = results.allocate(ColumnsAtOnce * pitch))
-        return failed;
-    if (const ErrorCode failed = InverseRows(rowPlan, in, rows, cols, shift, used, work.data()))
-        return failed;
-    int32_t done = ColumnsAtOnce;
-    for (int32_t c = 0; c < cols && done == ColumnsAtOnce; c += ColumnsAtOnce) {
-        const int32_t count = ColumnsInBlock(c, cols);
-        GatherHalfComplex(work.data() + c, PaddedPitch(cols), rows, count, columns.data(), pitch);
-        done = ColumnsDone(count, [&](int32_t i) {
-            return FFTRealInverse(columnPlan, columns.data() + i * pitch,
-                                  results.data() + i * pitch, 1, 1, rows);
-        });
-        ScatterColumns<ElementType::DBL>(results.data(), pitch, rows, done, out + c, cols);
-    }
-    return 0;
+    return InverseMatrix<RealColumns>(rowPlan, columnPlan, in, rows, cols, shift, out);
 }
 
 } // namespace qx

@@ -1,5 +1,6 @@
 #include "special/airy.h"
 
+#include "frame/constants.h"
 #include "special/extended.h"
 #include "special/tables/airy.h"
 
@@ -14,7 +15,6 @@ constexpr double kOverflow = 103.892;
 constexpr double kSeriesLimit = 2.09;
 constexpr double kGrowthFrom = 8.3203353;
 constexpr double kFar = 0.02; // of 1 / zeta^2
-constexpr double kInvSqrtPi = 0.5641895835477563;
 
 // 2/3 x sqrt(x) in two doubles.
 Extended Zeta(double x) {
@@ -47,16 +47,15 @@ AiryValues Oscillating(double x) {
     const double s = sine + cosine;
     const double c = cosine - sine;
     const double root = std::sqrt(std::sqrt(a));
-    constexpr double scale = 0.3989422804014327; // 1 / sqrt(2 pi)
-    return {scale / root * (s * f - c * g), -scale * root * (c * fp + s * gp),
-            scale / root * (c * f + s * g), scale * root * (s * fp - c * gp)};
+    return {
+        kInverseRootTwoPi / root * (s * f - c * g), -kInverseRootTwoPi * root * (c * fp + s * gp),
+        kInverseRootTwoPi / root * (c * f + s * g), kInverseRootTwoPi * root * (s * fp - c * gp)};
 }
 
 // The two Maclaurin series and their derivatives; Ai = c1 f - c2 g, Bi = sqrt(3) (c1 f + c2 g).
 AiryValues Series(double x) {
     constexpr double c1 = 0.3550280538878172;
     constexpr double c2 = 0.2588194037928068;
-    constexpr double sqrt3 = 1.7320508075688772;
     constexpr double eps = 1.1102230246251565e-16;
     const double cube = x * x * x;
     double f = 1;
@@ -79,8 +78,8 @@ AiryValues Series(double x) {
             std::fabs(termF) <= eps * std::fabs(f) && std::fabs(termG) <= eps * std::fabs(g))
             break;
     }
-    return {c1 * f - c2 * g, c1 * fp - c2 * gp, sqrt3 * (c1 * f + c2 * g),
-            sqrt3 * (c1 * fp + c2 * gp)};
+    return {c1 * f - c2 * g, c1 * fp - c2 * gp, kRootThree * (c1 * f + c2 * g),
+            kRootThree * (c1 * fp + c2 * gp)};
 }
 
 // Ai and Ai' of the series in two doubles: their two parts cancel as x grows.
@@ -117,10 +116,9 @@ void CarefulDecay(double x, AiryValues *values) {
 } // namespace
 
 AiryValues Airy(double x) {
-    constexpr double nan = std::numeric_limits<double>::quiet_NaN();
     constexpr double largest = std::numeric_limits<double>::max();
     if (std::isnan(x))
-        return {nan, nan, nan, nan};
+        return {kNaN, kNaN, kNaN, kNaN};
     if (x > kOverflow)
         return {0, 0, largest, largest};
     if (x < -kSeriesLimit)
@@ -137,10 +135,10 @@ AiryValues Airy(double x) {
     const double u = 1 / zeta.high;
     const double decay = Exp({-zeta.high, -zeta.low});
     AiryValues values = {};
-    values.ai = kInvSqrtPi * decay / (2 * root) * table::aiDecay(u);
+    values.ai = kInverseRootPi * decay / (2 * root) * table::aiDecay(u);
     values.aip = -0.28209479177387814 * root * decay * table::aipDecay(u);
     if (x > kGrowthFrom) {
-        const double growth = kInvSqrtPi / decay;
+        const double growth = kInverseRootPi / decay;
         values.bi = growth / root * table::biGrowth(u);
         values.bip = growth * root * table::bipGrowth(u);
     } else {

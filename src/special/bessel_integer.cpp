@@ -1,21 +1,17 @@
 #include "special/bessel_integer.h"
 
+#include "frame/constants.h"
 #include "special/bessel_uniform.h"
 #include "special/extended.h"
 #include "special/reciprocal_gamma.h"
 #include "special/tables/bessel.h"
 
 #include <cmath>
-#include <limits>
 
 namespace qx {
 
 namespace {
 
-constexpr double kInfinity = std::numeric_limits<double>::infinity();
-constexpr double kNaN = std::numeric_limits<double>::quiet_NaN();
-constexpr double kTwoOverPi = 0.6366197723675814;
-constexpr double kInvSqrtPi = 0.5641895835477563;
 constexpr double kSmall = 8;
 constexpr double kLowTo = 16; // in x^2, of Y less its logarithm
 constexpr double kFar = 20;
@@ -40,7 +36,7 @@ Wave Wave0(double x) {
     const double q = (far ? table::j0PhaseFarSin(z) : table::j0PhaseMidSin(z)) / x;
     const double s = std::sin(x);
     const double c = std::cos(x);
-    const double scale = kInvSqrtPi / std::sqrt(x);
+    const double scale = kInverseRootPi / std::sqrt(x);
     return {scale * ((c + s) * p - (s - c) * q), scale * ((s - c) * p + (c + s) * q)};
 }
 
@@ -51,7 +47,7 @@ Wave Wave1(double x) {
     const double q = (far ? table::j1PhaseFarSin(z) : table::j1PhaseMidSin(z)) / x;
     const double s = std::sin(x);
     const double c = std::cos(x);
-    const double scale = kInvSqrtPi / std::sqrt(x);
+    const double scale = kInverseRootPi / std::sqrt(x);
     return {scale * ((s - c) * p + (c + s) * q), scale * ((s - c) * q - (c + s) * p)};
 }
 

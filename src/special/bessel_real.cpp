@@ -1,5 +1,6 @@
 #include "special/bessel_real.h"
 
+#include "frame/constants.h"
 #include "special/bessel_integer.h"
 #include "special/bessel_uniform.h"
 #include "special/extended.h"
@@ -7,18 +8,13 @@
 
 #include <algorithm>
 #include <cmath>
-#include <limits>
 
 namespace qx {
 
 namespace {
 
-constexpr double kInfinity = std::numeric_limits<double>::infinity();
-constexpr double kNaN = std::numeric_limits<double>::quiet_NaN();
-constexpr double kEps = 2.220446049250313e-16;
 constexpr double kLowestOrder = -200;
 constexpr double kLargeOrder = 200;
-constexpr double kTwoOverPi = 0.6366197723675814;
 constexpr int kMostTerms = 1000;
 
 // The sum of q^k / (k! (order + 1)_k), q = -x^2/4 or x^2/4, in two doubles: terms of both signs
@@ -83,7 +79,7 @@ HankelSums SumHankel(double order, double x, double sign) {
             q += k % 4 == 1 ? term : sign * term;
         else
             p += k % 4 == 0 ? term : sign * term;
-        if (std::fabs(term) <= 0.25 * kEps)
+        if (std::fabs(term) <= 0.25 * kEpsilon)
             break;
     }
     return {p, q};
@@ -123,7 +119,7 @@ double RatioAbove(double order, double x) {
         c = b - 1 / c;
         const double factor = c * d;
         f *= factor;
-        if (std::fabs(factor - 1) <= 0.5 * kEps)
+        if (std::fabs(factor - 1) <= 0.5 * kEpsilon)
             break;
     }
     return 1 / f;
@@ -223,7 +219,7 @@ double BesselJ(double order, double x) {
         return IntegerJ(order, x);
     if (x < 0)
         return kNaN;
-    if (x < kEps)
+    if (x < kEpsilon)
         return 0; // kept: also where the order is negative or below 1
     return NonIntegerJ(order, x);
 }
@@ -250,7 +246,7 @@ double SphericalBesselJ(int32_t n, double x) {
     const double order = n + 0.5;
     if (order < kLowestOrder)
         return kNaN;
-    return std::sqrt(1.5707963267948966 / x) * NonIntegerJ(order, x);
+    return std::sqrt(kHalfPi / x) * NonIntegerJ(order, x);
 }
 
 double SphericalBesselY(int32_t n, double x) {
@@ -260,7 +256,7 @@ double SphericalBesselY(int32_t n, double x) {
         return -kInfinity;
     if (std::isinf(x))
         return 0;
-    return std::sqrt(1.5707963267948966 / x) * BesselY(n + 0.5, x);
+    return std::sqrt(kHalfPi / x) * BesselY(n + 0.5, x);
 }
 
 double BesselI(double order, double x) {
@@ -289,7 +285,7 @@ double BesselI(double order, double x) {
     if (x >= 40 && x >= 0.5 * a * a) {
         const HankelSums sums = SumHankel(order, x, 1);
         const double half = std::exp(0.5 * x);
-        return half * (half * ((sums.p - sums.q) / std::sqrt(6.283185307179586 * x)));
+        return half * (half * ((sums.p - sums.q) / std::sqrt(kTwoPi * x)));
     }
     const double factor = PowerOverGamma(0.5 * x, order);
     if (order > 0)

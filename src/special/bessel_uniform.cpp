@@ -1,19 +1,16 @@
 #include "special/bessel_uniform.h"
 
+#include "frame/constants.h"
 #include "special/airy.h"
 #include "special/diagonal.h"
 #include "special/extended.h"
 #include "special/tables/uniform.h"
 
 #include <cmath>
-#include <limits>
 
 namespace qx {
 
 namespace {
-
-constexpr double kTwoPi = 6.283185307179586;
-constexpr double kInfinity = std::numeric_limits<double>::infinity();
 
 // u_k(t) / order^k for t^2 = square, all real: t^k sits in `power`.
 template <class Term>
@@ -115,7 +112,7 @@ ModifiedPair ModifiedBesselLargeOrder(double order, double x) {
 ComplexModifiedPair ModifiedBesselOnDiagonal(double order, double x) {
     // z = x exp(i pi / 4): s^2 = order^2 + i x^2
     const Complex s = SquareRoot(Complex{order * order, x * x});
-    const Complex z = {x * 0.7071067811865476, x * 0.7071067811865476};
+    const Complex z = {x * kRootHalf, x * kRootHalf};
     const Complex logarithm = Log((s + order) / z); // asinh(order / z)
     const Complex exponent = s - logarithm * order;
     const Complex t = Complex{order, 0} / s;

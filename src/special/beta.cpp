@@ -1,5 +1,6 @@
 #include "special/beta.h"
 
+#include "frame/constants.h"
 #include "special/digamma.h"
 #include "special/extended.h"
 #include "special/rational.h"
@@ -7,14 +8,11 @@
 #include "stats/gamma.h"
 
 #include <cmath>
-#include <limits>
 
 namespace qx {
 
 namespace {
 
-constexpr double kNaN = std::numeric_limits<double>::quiet_NaN();
-constexpr double kSqrtTwoPi = 2.5066282746310007;
 constexpr double kStirlingFrom = 10;
 constexpr double kTiny = 1e-20;
 constexpr double kGammasTo = 33;
@@ -58,7 +56,7 @@ double ByStirling(double a, double b) {
     const Extended s = p + q;
     const double correction =
         StirlingCorrection(p.high) + StirlingCorrection(q.high) - StirlingCorrection(s.high);
-    return product.high * kSqrtTwoPi * std::sqrt(s.high / p.high / q.high) * PowerOfShare(p, s) *
+    return product.high * kRootTwoPi * std::sqrt(s.high / p.high / q.high) * PowerOfShare(p, s) *
            PowerOfShare(q, s) * std::exp(correction);
 }
 

@@ -1,5 +1,6 @@
 #include "special/confluent.h"
 
+#include "frame/constants.h"
 #include "special/bessel_real.h"
 #include "special/extended.h"
 #include "special/gamma_quotient.h"
@@ -9,20 +10,15 @@
 
 #include <algorithm>
 #include <cmath>
-#include <limits>
 
 namespace qx {
 
 namespace {
 
-constexpr double kInfinity = std::numeric_limits<double>::infinity();
-constexpr double kNaN = std::numeric_limits<double>::quiet_NaN();
-constexpr double kEps = 2.220446049250313e-16;
-constexpr double kAllDigits = 8 * kEps;
+constexpr double kAllDigits = 8 * kEpsilon;
 constexpr double kPairEps = 1e-30; // of sums in two doubles
 constexpr double kUnusable = 1e38;
 constexpr double kNoDigits = 0.01;
-constexpr double kPi = 3.141592653589793;
 
 constexpr double kSeriesStop = 8.881784197001252e-16;
 constexpr double kStopCareful = 1e-20;
@@ -61,7 +57,7 @@ KummerEstimate Unusable() { return {kNaN, kUnusable, kUnusable}; }
 double LimitSeries(double c, double w) {
     double term = 1;
     double sum = 1;
-    for (double k = 0; k < 40 && std::fabs(term) > 0.25 * kEps; k += 1) {
+    for (double k = 0; k < 40 && std::fabs(term) > 0.25 * kEpsilon; k += 1) {
         term *= -w / ((k + 1) * (c + k));
         sum += term;
     }
@@ -92,7 +88,7 @@ void FillBlock(double c, double w, int count, double *block) {
 double BesselError(double b, double w) {
     const double x = 2 * std::sqrt(w);
     const double hankel = x > kHankelFrom && !IsInteger(b) ? std::exp(-2 * x) : 0.0;
-    return (4 + x) * kEps + hankel;
+    return (4 + x) * kEpsilon + hankel;
 }
 
 // Where no digit is left, the estimate itself means nothing.
@@ -118,17 +114,17 @@ AsymptoticSum SumAsymptotic(double p, double q, double y) {
     double largest = 1;
     for (double n = 0; n < kMostAsymptoticTerms; n += 1) {
         const double ratio = (p + n) * (q + n) / (n + 1) * y;
-        if (ratio == 0 || std::fabs(term) <= 0.25 * kEps * std::fabs(sum))
+        if (ratio == 0 || std::fabs(term) <= 0.25 * kEpsilon * std::fabs(sum))
             break;
         if (!(std::fabs(ratio) < 1) && n > -p && n > -q)
-            return {sum, std::fmax(std::fabs(term), kEps * largest) / std::fabs(sum)};
+            return {sum, std::fmax(std::fabs(term), kEpsilon * largest) / std::fabs(sum)};
         if (n + 1 == kMostAsymptoticTerms)
             return {sum, kUnusable};
         term *= ratio;
         sum += term;
         largest = std::max(largest, std::fabs(term));
     }
-    return {sum, kEps * largest / std::fabs(sum)};
+    return {sum, kEpsilon * largest / std::fabs(sum)};
 }
 
 // gamma(b) / gamma(a) y^power exp(scale).
@@ -197,7 +193,8 @@ KummerEstimate KummerBessel(double a, double b, double x) {
 
 KummerEstimate KummerSeries(double a, double b, double x) {
     const KummerTerms terms = {a, b, x};
-    const KummerEstimate plain = Judge(SumSeries<double>(terms, kSeriesStop, 0, kMostTerms), kEps);
+    const KummerEstimate plain =
+        Judge(SumSeries<double>(terms, kSeriesStop, 0, kMostTerms), kEpsilon);
     if (plain.error <= kAllDigits)
         return plain;
     // the terms cancel: the series in two doubles
@@ -290,7 +287,7 @@ double TricomiAsymptotic(double x, double a, double b) {
         }
         sum += term;
         term *= -r;
-        if (std::fabs(term) <= 0.25 * kEps * std::fabs(sum) || std::isnan(sum))
+        if (std::fabs(term) <= 0.25 * kEpsilon * std::fabs(sum) || std::isnan(sum))
             return sum * std::pow(x, -a);
     }
     return kNaN;

@@ -1,5 +1,6 @@
 #include "special/dawson.h"
 
+#include "frame/constants.h"
 #include "special/extended.h"
 #include "special/tables/dawson.h"
 #include "special/tables/fresnel.h"
@@ -23,7 +24,6 @@ double Dawson(double x) {
 }
 
 FresnelValues Fresnel(double x) {
-    constexpr double pi = 3.141592653589793;
     const double a = std::fabs(x);
     if (std::isnan(x))
         return {x, x};
@@ -42,13 +42,13 @@ FresnelValues Fresnel(double x) {
         const double cosine = CosPi(0.5 * quarters);
         const double w = 1 / (square.high * square.high);
         const bool far = a >= 3;
-        const double f = (far ? table::fresnelFFar(w) : table::fresnelFMid(w)) / (pi * a);
+        const double f = (far ? table::fresnelFFar(w) : table::fresnelFMid(w)) / (kPi * a);
         const double g =
-            (far ? table::fresnelGFar(w) : table::fresnelGMid(w)) / (pi * pi * (a * square.high));
+            (far ? table::fresnelGFar(w) : table::fresnelGMid(w)) / (kPi * kPi * (a * square.high));
         c += f * sine - g * cosine;
         s -= f * cosine + g * sine;
     } else {
-        s -= 1 / (pi * a); // x is even, so the phase is a multiple of 2 pi
+        s -= 1 / (kPi * a); // x is even, so the phase is a multiple of 2 pi
     }
     return x < 0 ? FresnelValues{-c, -s} : FresnelValues{c, s};
 }

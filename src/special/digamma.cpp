@@ -1,18 +1,14 @@
 #include "special/digamma.h"
 
+#include "frame/constants.h"
 #include "stats/gamma.h"
 
 #include <cmath>
-#include <limits>
 
 namespace qx {
 
 namespace {
 
-constexpr double kInfinity = std::numeric_limits<double>::infinity();
-constexpr double kNaN = std::numeric_limits<double>::quiet_NaN();
-constexpr double kPi = 3.141592653589793;
-constexpr double kEuler = 0.5772156649015329;
 constexpr double kSeriesFrom = 10;
 constexpr double kLogarithmFrom = 1e9; // here the series no longer counts
 

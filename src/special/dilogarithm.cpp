@@ -1,16 +1,14 @@
 #include "special/dilogarithm.h"
 
+#include "frame/constants.h"
 #include "special/tables/dilogarithm.h"
 
 #include <cmath>
-#include <limits>
 
 namespace qx {
 
 namespace {
 
-constexpr double kInfinity = std::numeric_limits<double>::infinity();
-constexpr double kNaN = std::numeric_limits<double>::quiet_NaN();
 constexpr double kPiSquareOver6 = 1.6449340668482264;
 
 } // namespace

@@ -1,18 +1,14 @@
 #include "special/elliptic.h"
 
+#include "frame/constants.h"
 #include "special/tables/elliptic.h"
 
 #include <cmath>
-#include <limits>
 
 namespace qx {
 
 namespace {
 
-constexpr double kNaN = std::numeric_limits<double>::quiet_NaN();
-constexpr double kEps = 2.220446049250313e-16;
-constexpr double kPi = 3.141592653589793;
-constexpr double kHalfPi = 1.5707963267948966;
 constexpr double kHalfPiLow = 6.123233995736766e-17; // pi / 2 less its double
 constexpr int kMostRounds = 40;                      // of Landen's transformation; about 8 are made
 
@@ -32,7 +28,7 @@ LandenSums Landen(double phi, double m) {
     double t = std::tan(phi);
     double turns = 0;
     double extra = 0;
-    for (int round = 0; round < kMostRounds && std::fabs(c / a) > kEps; ++round) {
+    for (int round = 0; round < kMostRounds && std::fabs(c / a) > kEpsilon; ++round) {
         const double ratio = b / a;
         phi += std::atan(t * ratio) + turns * kPi;
         turns = std::floor((phi + kHalfPi) / kPi);
@@ -60,7 +56,7 @@ Amplitude Split(double phi) {
     return {n, (phi - n * kPi) - n * (2 * kHalfPiLow)};
 }
 
-bool IsQuarter(double phi) { return std::fabs(phi - kHalfPi) <= kEps; }
+bool IsQuarter(double phi) { return std::fabs(phi - kHalfPi) <= kEpsilon; }
 
 } // namespace
 
@@ -157,7 +153,7 @@ JacobiValues ByMeans(double u, double m) {
     double scale = 1;
     int i = 0;
     // eps a is exact, and so c / a, rounded, exceeds eps where c exceeds eps a
-    while (i < rounds && std::fabs(c[i]) > kEps * a[i]) {
+    while (i < rounds && std::fabs(c[i]) > kEpsilon * a[i]) {
         a[i + 1] = 0.5 * (a[i] + b);
         c[i + 1] = 0.5 * (a[i] - b);
         b = std::sqrt(a[i] * b);
@@ -165,7 +161,7 @@ JacobiValues ByMeans(double u, double m) {
         ++i;
     }
     double phi = scale * a[i] * u;
-    if (i > 0 && std::fabs(phi) >= 4 && std::fabs(c[i]) <= kEps * a[i]) {
+    if (i > 0 && std::fabs(phi) >= 4 && std::fabs(c[i]) <= kEpsilon * a[i]) {
         phi *= 0.5; // the last arc sine is below half a unit in the last place of phi
         --i;
     }

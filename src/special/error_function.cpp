@@ -1,5 +1,6 @@
 #include "special/error_function.h"
 
+#include "frame/constants.h"
 #include "special/extended.h"
 #include "special/tables/error_function.h"
 
@@ -9,7 +10,6 @@ namespace qx {
 
 namespace {
 
-constexpr double kLogOfLargest = 709.782712893384;
 constexpr double kFarFrom = 8;
 
 // exp(-x^2) with the square in two doubles: the exponential multiplies its rounding error by x^2.

@@ -1,23 +1,18 @@
 #include "special/exponential_integral.h"
 
+#include "frame/constants.h"
 #include "stats/gamma.h"
 
 #include <array>
 #include <cmath>
 #include <cstddef>
-#include <limits>
 
 namespace qx {
 
 namespace {
 
-constexpr double kInfinity = std::numeric_limits<double>::infinity();
-constexpr double kNaN = std::numeric_limits<double>::quiet_NaN();
-constexpr double kEps = 2.220446049250313e-16;
-constexpr double kEuler = 0.5772156649015329;
 constexpr double kBig = 1.4411518807585587e+17;       // 2^57
 constexpr double kInverseBig = 6.938893903907228e-18; // 2^-57
-constexpr double kLogOfLargest = 709.782712893384;
 constexpr int32_t kLargeOrder = 5001;
 constexpr int32_t kWithoutLogarithm = 170; // (n - 1)! has left the range
 
@@ -49,7 +44,7 @@ struct Convergents {
             q2 *= kInverseBig;
         }
     }
-    bool haveSettled() const { return difference <= kEps * value; }
+    bool haveSettled() const { return difference <= kEpsilon * value; }
 };
 
 double ContinuedFraction(double x, double n) {
@@ -93,7 +88,7 @@ double PowerSeries(double x, int32_t n) {
         p += 1;
         if (p != 0)
             sum += term / p;
-    } while (sum == 0 || std::fabs(term) > kEps * std::fabs(sum));
+    } while (sum == 0 || std::fabs(term) > kEpsilon * std::fabs(sum));
     if (n >= kWithoutLogarithm)
         return -sum; // kept: the first term no longer counts
     return LogarithmicTerm(x, n) - sum;

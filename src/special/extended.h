@@ -1,6 +1,8 @@
 #ifndef QX_SPECIAL_EXTENDED_H
 #define QX_SPECIAL_EXTENDED_H
 
+#include "frame/constants.h"
+
 #include <cmath>
 
 namespace qx {
@@ -64,30 +66,28 @@ inline Extended SquareRoot(Extended a) {
 
 // sin(pi x) and cos(pi x), exact zeros and ones included.
 inline double SinPi(double x) {
-    constexpr double pi = 3.141592653589793;
     const double r = std::fmod(std::fabs(x), 2.0);
     const double s = r >= 1 ? -1.0 : 1.0;
     const double t = r >= 1 ? r - 1 : r;
     double value;
     if (t <= 0.25)
-        value = std::sin(pi * t);
+        value = std::sin(kPi * t);
     else if (t <= 0.75)
-        value = std::cos(pi * (0.5 - t));
+        value = std::cos(kPi * (0.5 - t));
     else
-        value = std::sin(pi * (1 - t));
+        value = std::sin(kPi * (1 - t));
     return x < 0 ? -s * value : s * value;
 }
 
 inline double CosPi(double x) {
-    constexpr double pi = 3.141592653589793;
     double r = std::fmod(std::fabs(x), 2.0);
     if (r > 1)
         r = 2 - r;
     if (r <= 0.25)
-        return std::cos(pi * r);
+        return std::cos(kPi * r);
     if (r <= 0.75)
-        return r == 0.5 ? 0.0 : std::sin(pi * (0.5 - r));
-    return -std::cos(pi * (1 - r));
+        return r == 0.5 ? 0.0 : std::sin(kPi * (0.5 - r));
+    return -std::cos(kPi * (1 - r));
 }
 
 inline bool IsInteger(double x) { return std::floor(x) == x && !std::isinf(x); }

@@ -1,18 +1,16 @@
 #include "special/factorial.h"
 
+#include "frame/constants.h"
 #include "special/extended.h"
 #include "stats/gamma.h"
 
 #include <array>
 #include <cstddef>
-#include <limits>
 
 namespace qx {
 
 namespace {
 
-constexpr double kNaN = std::numeric_limits<double>::quiet_NaN();
-constexpr double kInfinity = std::numeric_limits<double>::infinity();
 constexpr int32_t kLastInTable = 33;
 constexpr int32_t kLastProduct = 50;
 constexpr int32_t kLastFinite = 170;

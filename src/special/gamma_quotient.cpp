@@ -1,18 +1,16 @@
 #include "special/gamma_quotient.h"
 
+#include "frame/constants.h"
 #include "special/extended.h"
 #include "special/reciprocal_gamma.h"
 #include "stats/gamma.h"
 
 #include <cmath>
-#include <limits>
 
 namespace qx {
 
 namespace {
 
-constexpr double kNaN = std::numeric_limits<double>::quiet_NaN();
-constexpr double kPi = 3.141592653589793;
 constexpr double kDirectTo = 50; // the product of six stays in range
 
 bool IsPole(double x) { return x <= 0 && IsInteger(x); }

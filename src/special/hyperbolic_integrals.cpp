@@ -1,18 +1,15 @@
 #include "special/hyperbolic_integrals.h"
 
+#include "frame/constants.h"
 #include "special/tables/hyperbolic_integrals.h"
 
 #include <cmath>
 #include <cstddef>
-#include <limits>
 
 namespace qx {
 
 namespace {
 
-constexpr double kInfinity = std::numeric_limits<double>::infinity();
-constexpr double kEps = 2.220446049250313e-16;
-constexpr double kEuler = 0.5772156649015329;
 constexpr double kSeriesTo = 8;
 constexpr double kMidTo = 18;
 constexpr double kLargest = 880;
@@ -28,7 +25,7 @@ double SeriesOnward(double square, double term, double exponent) {
         added = term / exponent;
         sum += added;
         exponent += 2;
-    } while (added > kEps * sum);
+    } while (added > kEpsilon * sum);
     return sum;
 }
 

@@ -1,5 +1,6 @@
 #include "special/hypergeometric.h"
 
+#include "frame/constants.h"
 #include "special/digamma.h"
 #include "special/extended.h"
 #include "special/gamma_quotient.h"
@@ -7,14 +8,11 @@
 
 #include <algorithm>
 #include <cmath>
-#include <limits>
 
 namespace qx {
 
 namespace {
 
-constexpr double kInfinity = std::numeric_limits<double>::infinity();
-constexpr double kNaN = std::numeric_limits<double>::quiet_NaN();
 constexpr double kStop = 8.881784197001252e-16;
 constexpr double kStopCareful = 1e-20;
 constexpr double kCancelled = 8;

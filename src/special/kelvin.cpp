@@ -1,22 +1,18 @@
 #include "special/kelvin.h"
 
+#include "frame/constants.h"
 #include "special/bessel_uniform.h"
 #include "special/diagonal.h"
 #include "special/extended.h"
 #include "special/reciprocal_gamma.h"
 
 #include <cmath>
-#include <limits>
 
 namespace qx {
 
 namespace {
 
-constexpr double kNaN = std::numeric_limits<double>::quiet_NaN();
-constexpr double kPi = 3.141592653589793;
-constexpr double kEps = 2.220446049250313e-16;
 constexpr double kTwoGamma = 1.1544313298030657; // twice Euler's constant
-constexpr double kDiagonal = 0.7071067811865476;
 
 // i^n times the number.
 Complex Turn(Complex a, double n) {
@@ -55,7 +51,7 @@ Complex SeriesI(double n, double x) {
 
 // exp(+-z) of z = x exp(i pi / 4), whose parts are formed in two doubles.
 Complex ExpOnDiagonal(double x, double sign) {
-    constexpr Extended diagonal = {kDiagonal, -4.833646656726457e-17};
+    constexpr Extended diagonal = {kRootHalf, -4.833646656726457e-17};
     const Extended part = diagonal * Extended{sign * x, 0};
     const Complex e = Exp(Complex{part.high, part.high});
     return e * Complex{1 + part.low, part.low};
@@ -90,7 +86,7 @@ OrdersZeroOne ContinuedK(Complex z, double x) {
         h = h + step;
         const Complex change = q * step;
         s = s + change;
-        if (Size(change) <= 0.25 * kEps * Size(s))
+        if (Size(change) <= 0.25 * kEpsilon * Size(s))
             break;
     }
     OrdersZeroOne k = {};
@@ -159,7 +155,7 @@ Complex AsymptoticI(double n, Complex z, double x) {
         const double odd = 2 * k - 1;
         term = term * inverse * ((odd * odd - square) / k);
         sum = sum + term;
-        if (Size(term) <= 0.25 * kEps)
+        if (Size(term) <= 0.25 * kEpsilon)
             break;
     }
     return ExpOnDiagonal(x, 1) * (sum / SquareRoot(z * (2 * kPi)));
@@ -186,7 +182,7 @@ KelvinPair KelvinI(double x, int32_t n) {
     const double a = std::fabs(x);
     if (a == 0)
         return {m == 0 ? 1.0 : 0.0, 0};
-    const Complex z = {a * kDiagonal, a * kDiagonal};
+    const Complex z = {a * kRootHalf, a * kRootHalf};
     Complex value;
     if (a <= 5 || (a < 50 && 0.25 * a * a < m)) {
         value = SeriesI(m, a);
@@ -218,7 +214,7 @@ KelvinPair KelvinK(double x, int32_t n) {
     } else if (x > 1100) {
         value = {0, 0};
     } else {
-        const Complex z = {x * kDiagonal, x * kDiagonal};
+        const Complex z = {x * kRootHalf, x * kRootHalf};
         value = Turn(UpwardK(static_cast<int>(m), z, x).k, quarters);
     }
     return n < 0 && IsOdd(m) ? KelvinPair{-value.re, -value.im} : KelvinPair{value.re, value.im};

@@ -1,24 +1,18 @@
 #include "special/parabolic_cylinder.h"
 
+#include "frame/constants.h"
 #include "special/extended.h"
 #include "special/reciprocal_gamma.h"
 
 #include <cmath>
-#include <limits>
 
 namespace qx {
 
 namespace {
 
-constexpr double kNaN = std::numeric_limits<double>::quiet_NaN();
-constexpr double kInfinity = std::numeric_limits<double>::infinity();
-constexpr double kEps = 2.220446049250313e-16;
 // Below 40 the other methods serve, so the asymptotic series has to be as good as they are.
 constexpr double kAsymptoticLimit = 1e-12;
 constexpr double kAsymptoticLimitBelow40 = 1e-15;
-constexpr double kRootPi = 1.772453850905516;
-constexpr double kRootTwoPi = 2.5066282746310002;
-constexpr double kRootTwo = 1.4142135623730951;
 constexpr double kMostSteps = 1000; // D overflows near order 340 unless x is large
 
 // exp(sign x^2 / 4); the square is exact, because the exponential multiplies its rounding error.
@@ -41,7 +35,7 @@ bool AsymptoticSum(double a, double x, double sign, double *sum) {
             break;
         term = next;
         *sum += term;
-        if (std::fabs(term) <= 0.1 * kEps * std::fabs(*sum))
+        if (std::fabs(term) <= 0.1 * kEpsilon * std::fabs(*sum))
             break;
     }
     // a sum far below its terms has cancelled

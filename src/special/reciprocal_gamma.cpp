@@ -1,5 +1,6 @@
 #include "special/reciprocal_gamma.h"
 
+#include "frame/constants.h"
 #include "special/extended.h"
 #include "special/tables/reciprocal_gamma.h"
 
@@ -9,8 +10,6 @@ namespace qx {
 
 namespace {
 
-constexpr double kPi = 3.141592653589793;
-constexpr double kE = 2.718281828459045;
 constexpr double kELow = 1.4456468917292502e-16;
 constexpr double kStirlingFrom = 20;
 

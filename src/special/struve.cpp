@@ -1,25 +1,21 @@
 #include "special/struve.h"
 
+#include "frame/constants.h"
 #include "special/bessel_real.h"
 #include "special/extended.h"
 #include "special/reciprocal_gamma.h"
 
 #include <cmath>
-#include <limits>
 
 namespace qx {
 
 namespace {
 
-constexpr double kNaN = std::numeric_limits<double>::quiet_NaN();
-constexpr double kEps = 2.220446049250313e-16;
 constexpr double kStop = 1.8046660579423136e-14;
 constexpr double kMostTerms = 200;
 constexpr double kLargestTerm = 1e35;
 constexpr double kUnusable = 1e38;
-constexpr double kHalfRootPi = 0.886226925452758; // gamma(3/2)
-constexpr double kRootPi = 1.772453850905516;     // gamma(1/2)
-constexpr double kPairEps = 1e-31;                // of sums in two doubles
+constexpr double kPairEps = 1e-31; // of sums in two doubles
 
 struct Estimate {
     double sum;
@@ -72,7 +68,7 @@ Estimate Struve3F0(double x, double v) {
         if (last <= 0.01 * kStop * std::fabs(sum))
             break;
     }
-    return Judge(sum, last, largest, kEps);
+    return Judge(sum, last, largest, kEpsilon);
 }
 
 // (x/2)^v / gamma(v + 1/2 + shift), shift 0 or 1, without overflow for large v.
@@ -100,7 +96,7 @@ double Struve(double x, double v) {
 
     const bool ascends = x <= 30 || x <= 1.5 * std::fabs(v);
     const Estimate first = ascends ? Struve1F2(x, v) : Estimate{0, kUnusable};
-    const bool certain = first.error < 0.25 * kEps; // the other candidate cannot be better
+    const bool certain = first.error < 0.25 * kEpsilon; // the other candidate cannot be better
     const Estimate second = x >= 18 && !certain ? Struve3F0(x, v) : Estimate{0, kUnusable};
     if (ascends && !(first.error > second.error))
         return first.sum * (0.5 * x / kHalfRootPi) * Factor(x, v, 1);

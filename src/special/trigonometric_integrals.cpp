@@ -1,17 +1,14 @@
 #include "special/trigonometric_integrals.h"
 
+#include "frame/constants.h"
 #include "special/tables/trigonometric_integrals.h"
 
 #include <cmath>
-#include <limits>
 
 namespace qx {
 
 namespace {
 
-constexpr double kInfinity = std::numeric_limits<double>::infinity();
-constexpr double kHalfPi = 1.5707963267948966;
-constexpr double kEuler = 0.5772156649015329;
 constexpr double kSmallTo = 4;
 constexpr double kFarFrom = 8;
 

@@ -1,15 +1,13 @@
 #include "stats/distributions.h"
 
+#include "frame/constants.h"
 #include "stats/gamma.h"
 
 #include <cmath>
-#include <limits>
 
 namespace qx {
 
 namespace {
-
-constexpr double infinity = std::numeric_limits<double>::infinity();
 
 // A NaN is not refused.
 bool IsNoProbability(double p) { return p < 0.0 || p > 1.0; }
@@ -18,7 +16,7 @@ bool IsNoProbability(double p) { return p < 0.0 || p > 1.0; }
 bool IsCertain(double p, double lowerEnd, DBL *quantile) {
     if (p != 0.0 && p != 1.0)
         return false;
-    *quantile = p == 0.0 ? lowerEnd : infinity;
+    *quantile = p == 0.0 ? lowerEnd : kInfinity;
     return true;
 }
 
@@ -76,7 +74,7 @@ ErrorCode ChiSquareCDF(double x, int32_t dof, DBL *p) {
 ErrorCode NormalQuantile(double p, DBL *x) {
     if (IsNoProbability(p))
         return ErrProbabilityOutOfRange;
-    if (IsCertain(p, -infinity, x))
+    if (IsCertain(p, -kInfinity, x))
         return 0;
     const auto ratio = [](double u) {
         return ((0.010328 * u + 0.802853) * u + 2.515517) /
@@ -97,7 +95,7 @@ ErrorCode StudentQuantile(double p, int32_t dof, DBL *t) {
         return ErrTooFewForParameters;
     if (IsNoProbability(p))
         return ErrProbabilityOutOfRange;
-    if (IsCertain(p, -infinity, t))
+    if (IsCertain(p, -kInfinity, t))
         return 0;
     *t = Bisect(p, -10000.0, 10000.0, [dof](double mid) {
         double value = 0.0;

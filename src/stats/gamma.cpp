@@ -1,38 +1,33 @@
 #include "stats/gamma.h"
+#include "frame/constants.h"
 
 #include <algorithm>
 #include <cmath>
-#include <limits>
-#include <numbers>
 
 namespace qx {
 
 namespace {
 
-constexpr double epsilon = 2.220446049250313e-16;
 constexpr double big = 1.4411518807585587e+17;       // 2^57
 constexpr double inverseBig = 6.938893903907228e-18; // 2^-57
 constexpr double endOfIntegers = 9007199254740992.0; // 2^53, from where x + 1 is rounded to x
-constexpr double infinity = std::numeric_limits<double>::infinity();
-constexpr double quietNaN = std::numeric_limits<double>::quiet_NaN();
-constexpr double pi = std::numbers::pi;
 
 // Gamma(x) for x < -33 by reflection.
 double ReflectedGamma(double x) {
     const double q = std::fabs(x);
     double p = std::floor(q);
     if (p == q)
-        return quietNaN;
+        return kNaN;
     const double sign = std::fmod(p, 2.0) == 0.0 ? -1.0 : 1.0;
     double z = q - p;
     if (z > 0.5) {
         p += 1.0;
         z = q - p;
     }
-    const double w = q * std::sin(pi * z);
+    const double w = q * std::sin(kPi * z);
     if (w == 0.0)
         return w * sign;
-    return pi / (std::fabs(w) * StirlingGamma(q)) * sign;
+    return kPi / (std::fabs(w) * StirlingGamma(q)) * sign;
 }
 
 // The convergents of a continued fraction, numerators p and denominators q, kept in range by
@@ -71,7 +66,7 @@ double BetaConvergents(double z, double a, double k2, double step2, double k6, d
         if (ratio != 0.0) {
             change = std::fabs((value - ratio) / ratio);
             value = ratio;
-            if (change < epsilon)
+            if (change < kEpsilon)
                 return value;
         }
         if (!std::isfinite(change))
@@ -86,7 +81,7 @@ double BetaConvergents(double z, double a, double k2, double step2, double k6, d
         k8 += 2.0;
         if (std::fabs(c.q) + std::fabs(c.p) > big)
             c.scale(inverseBig);
-        if (std::fabs(c.q) < epsilon || std::fabs(c.p) < epsilon)
+        if (std::fabs(c.q) < kEpsilon || std::fabs(c.p) < kEpsilon)
             c.scale(big);
     }
     return value;
@@ -105,14 +100,14 @@ double LogOfFront(double a, double x) { return a * std::log(x) - x - LnGammaFunc
 
 // Faults and limits that P and Q share; `atInfinity` is the value at x = +infinity.
 bool IsSpecial(double a, double x, double atInfinity, double atZero, double *value) {
-    if (x == infinity)
+    if (x == kInfinity)
         *value = atInfinity;
-    else if (std::isnan(x) || x == -infinity || std::isnan(a) || a == -infinity)
-        *value = quietNaN;
-    else if (a == infinity && (x > 0.0 || atInfinity == 0.0))
-        *value = infinity;
+    else if (std::isnan(x) || x == -kInfinity || std::isnan(a) || a == -kInfinity)
+        *value = kNaN;
+    else if (a == kInfinity && (x > 0.0 || atInfinity == 0.0))
+        *value = kInfinity;
     else if (x < 0.0 || a <= 0.0)
-        *value = quietNaN;
+        *value = kNaN;
     else if (x == 0.0)
         *value = atZero;
     else
@@ -138,29 +133,28 @@ double PolyEvalMonic(double x, const double *coef, int degree) {
 
 double StirlingGamma(double x) {
     if (std::isnan(x) || x < 0.0)
-        return quietNaN;
-    if (x == 0.0 || x >= 709.782712893384)
-        return infinity;
+        return kNaN;
+    if (x == 0.0 || x >= kLogOfLargest)
+        return kInfinity;
     static constexpr double series[] = {0.0007873113957930937, -0.00022954996161337813,
                                         -0.0026813261780578124, 0.0034722222160545866,
                                         0.08333333333334822};
-    constexpr double sqrtTwoPi = 2.5066282746310007;
     const double v = 1.0 / x;
     const double w = 1.0 + v * PolyEval(v, series, 4);
     if (!std::isfinite(w))
-        return infinity;
+        return kInfinity;
     const double y = std::exp(x);
     if (x <= 143.01608)
-        return sqrtTwoPi * w * std::pow(x, x - 0.5) / y;
+        return kRootTwoPi * w * std::pow(x, x - 0.5) / y;
     const double root = std::pow(x, 0.5 * x - 0.25); // the whole power would overflow
-    return sqrtTwoPi * w * (root / y) * root;
+    return kRootTwoPi * w * (root / y) * root;
 }
 
 double GammaFunction(double x) {
-    if (x == infinity)
-        return infinity;
-    if (std::isnan(x) || x == -infinity)
-        return quietNaN;
+    if (x == kInfinity)
+        return kInfinity;
+    if (std::isnan(x) || x == -kInfinity)
+        return kNaN;
     if (std::fabs(x) > 33.0)
         return x > 0.0 ? StirlingGamma(x) : ReflectedGamma(x);
 
@@ -171,7 +165,7 @@ double GammaFunction(double x) {
     }
     while (x < 2.0) {
         if (std::fabs(x) < 1e-09)
-            return x == 0.0 ? quietNaN : z / ((1.0 + 0.5772156649015329 * x) * x);
+            return x == 0.0 ? kNaN : z / ((1.0 + kEuler * x) * x);
         z /= x;
         x += 1.0;
     }
@@ -192,12 +186,12 @@ double GammaFunction(double x) {
 }
 
 double LnGammaFunction(double x) {
-    if (x == infinity)
-        return infinity;
+    if (x == kInfinity)
+        return kInfinity;
     if (std::isnan(x) || x < 0.0)
-        return quietNaN;
+        return kNaN;
     if (x == 0.0)
-        return infinity;
+        return kInfinity;
     if (x >= 33.0) {
         const double base = (x - 0.5) * std::log(x) - x + 0.9189385332046728;
         const double q = 1.0 / (x * x);
@@ -245,12 +239,12 @@ double IncompleteGammaP(double a, double x) {
         return 1.0 - IncompleteGammaQ(a, x);
     const double log = LogOfFront(a, x);
     if (!std::isfinite(log))
-        return infinity; // kept: not NaN
+        return kInfinity; // kept: not NaN
     const double front = std::exp(log);
     if (front == 0.0)
         return 0.0;         // whatever the sum, which is finite
     if (a >= endOfIntegers) // the terms no longer fall but as powers of x / a
-        return front / std::max(1.0 - x / a, epsilon) / a;
+        return front / std::max(1.0 - x / a, kEpsilon) / a;
     double r = a;
     double term = 1.0;
     double sum = 1.0;
@@ -258,7 +252,7 @@ double IncompleteGammaP(double a, double x) {
         r += 1.0;
         term *= x / r;
         sum += term;
-    } while (term / sum > epsilon);
+    } while (term / sum > kEpsilon);
     return front * sum / a;
 }
 
@@ -291,13 +285,13 @@ double IncompleteGammaQ(double a, double x) {
         }
         if (std::fabs(c.p) > big)
             c.scale(inverseBig);
-    } while (change > epsilon);
+    } while (change > kEpsilon);
     return value * front;
 }
 
 double IncompleteBeta(double a, double b, double x) {
     if (!std::isfinite(a) || !std::isfinite(b) || !(a >= 0.0 && b >= 0.0 && x >= 0.0 && x <= 1.0))
-        return quietNaN;
+        return kNaN;
     if (x == 0.0 || x == 1.0)
         return x;
     if (a == 1.0) {

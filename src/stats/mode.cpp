@@ -1,5 +1,6 @@
 #include "stats/mode.h"
 
+#include "frame/constants.h"
 #include "stats/histogram.h"
 #include "stats/order.h"
 
@@ -8,8 +9,6 @@
 namespace qx {
 
 namespace {
-
-constexpr double epsilon = 2.220446049250313e-16;
 
 // A growing list of modes at the front of a block that is still being read further back.
 struct ModeList {
@@ -51,7 +50,7 @@ ErrorCode BinnedMode(const DBL *x, int32_t n, int32_t intervals, Values &modes, 
     int32_t maxIndex, minIndex;
     if (const ErrorCode failed = ArrayMaxMin(x, n, &max, &maxIndex, &min, &minIndex))
         return failed;
-    if (std::fabs(max - min) <= std::fabs(max) * epsilon)
+    if (std::fabs(max - min) <= std::fabs(max) * kEpsilon)
         return SingleMode(max, modes, count);
 
     Scratch<ElementType::I32> counts;
@@ -73,13 +72,13 @@ ErrorCode ExactMode(const DBL *x, int32_t n, Values &modes, int32_t *count) {
         return failed;
     DBL *const a = modes.data(); // auto would drop the alignment
     SortAscending(x, n, 0, a);
-    if (std::fabs(a[0] - a[n - 1]) <= std::fabs(a[0]) * epsilon)
+    if (std::fabs(a[0] - a[n - 1]) <= std::fabs(a[0]) * kEpsilon)
         return KeepModes({a, n, 1}, modes, count);
     // NaNs stand at the front; each ends its run at once, since it compares false.
     ModeList list = {a, 1, 0};
     for (int32_t i = 0; i < n;) {
         const double value = a[i];
-        const double tolerance = std::fabs(value) * epsilon;
+        const double tolerance = std::fabs(value) * kEpsilon;
         int32_t run = 1;
         while (i + run < n && std::fabs(a[i + run] - value) <= tolerance)
             ++run;

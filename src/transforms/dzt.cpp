@@ -1,5 +1,6 @@
 #include "transforms/dzt.h"
 
+#include "frame/constants.h"
 #include "frame/scratch.h"
 
 #include <cmath>
@@ -8,8 +9,6 @@
 
 namespace qx {
 namespace {
-
-constexpr double TwoPi = 6.283185307179586;
 
 void Add(DBL &sum, DBL value) { sum += value; }
 void Add(CDB &sum, const CDB &value) {
@@ -139,7 +138,7 @@ ErrorCode BandTransform(const FFTPlan *plan, typename Element<Code>::type *x, in
         status = sub.transform(plan);
         if (status != 0)
             continue;
-        const double step = -TwoPi * (static_cast<double>(j) / static_cast<double>(L));
+        const double step = -kTwoPi * (static_cast<double>(j) / static_cast<double>(L));
         Accumulate(sub, firstBin, step, startInL * step, size, out);
     }
     return Merge(status, work.release());

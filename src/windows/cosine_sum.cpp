@@ -1,15 +1,13 @@
 #include "windows/cosine_sum.h"
 
+#include "frame/constants.h"
 #include "frame/scratch.h"
 
 #include <cmath>
-#include <numbers>
 
 namespace qx {
 
 namespace {
-
-constexpr double pi = std::numbers::pi;
 
 // The terms of a sum as they rotate: cosine and sine parts of b[k] exp(2 pi i j k / n) for the
 // present sample j, and the rotation by one sample.
@@ -118,9 +116,9 @@ ErrorCode ApplyCosineSumWindow(Signal x, int32_t n, const DBL *a, int32_t m, int
                    a[0] / divisor};
     double first = terms.constant;
     for (int32_t k = 1; k <= count; ++k) {
-        const double half = std::sin(pi * k / n);
+        const double half = std::sin(kPi * k / n);
         terms.alpha[k - 1] = 2.0 * (half * half);
-        terms.beta[k - 1] = std::sin(2.0 * pi * k / n);
+        terms.beta[k - 1] = std::sin(2.0 * kPi * k / n);
         terms.cosine[k - 1] = (k % 2 == 0 ? a[k] : -a[k]) / divisor;
         terms.sine[k - 1] = 0.0;
         first += terms.cosine[k - 1];

@@ -1,17 +1,14 @@
 #include "windows/tapers.h"
 
+#include "frame/constants.h"
 #include "windows/cosine_sum.h"
 
 #include <cmath>
-#include <limits>
-#include <numbers>
 #include <type_traits>
 
 namespace qx {
 
 namespace {
-
-constexpr double pi = std::numbers::pi;
 
 // A point that moves round the unit circle in equal steps.
 struct Rotation {
@@ -104,7 +101,7 @@ ErrorCode ApplyBartHannWindow(Signal x, int32_t n) {
         x.scale(0, 0.0);
         return 0;
     }
-    Rotation rotation(2.0 * pi / n);
+    Rotation rotation(2.0 * kPi / n);
     ScaleMirrored(x, n, [=](int32_t i) mutable {
         rotation.advance();
         return 0.62 - 0.48 * std::fabs(static_cast<double>(i) / n - 0.5) - 0.38 * rotation.cosine;
@@ -138,11 +135,10 @@ ErrorCode ApplyBohmanWindow(Signal x, int32_t n) {
         x.scale(0, 0.0);
         return 0;
     }
-    constexpr double inversePi = 0.3183098861837907;
-    Rotation rotation(2.0 * pi / n);
+    Rotation rotation(2.0 * kPi / n);
     ScaleMirrored(x, n, [=](int32_t i) mutable {
         rotation.advance();
-        return rotation.sine * inversePi - 2.0 * i / n * rotation.cosine;
+        return rotation.sine * kInversePi - 2.0 * i / n * rotation.cosine;
     });
     return 0;
 }
@@ -237,12 +233,12 @@ ErrorCode ApplyCosTaperedWindow(Signal x, int32_t n, double taperRatio) {
         return 0;
     x.clear(0);
     x.clear(n - 1);
-    const double delta = pi / (2.0 * taper);
+    const double delta = kPi / (2.0 * taper);
     double phase = delta;
     for (int32_t i = 1; i < taper; ++i) {
         // kept: the complex form takes the phase afresh, the real form accumulates it
         if constexpr (std::is_same_v<Signal, ComplexSignal>)
-            phase = i * pi / (2.0 * taper);
+            phase = i * kPi / (2.0 * taper);
         const double sine = std::sin(phase);
         x.scale(i, sine * sine);
         x.scale(n - 1 - i, sine * sine);
