@@ -4,9 +4,9 @@
 /* Cumulative distribution functions and their inverses.
 
    Scalars travel by reference. The function result is 0 and the code stands in *err; on any code
-   but 0 the result is NaN. A NaN as probability is not refused. docs/accuracy has the measured
-   errors. The numbers of formulas are those of M. Abramowitz and I. A. Stegun, Handbook of
-   mathematical functions, 1964. */
+   but 0 the result is NaN. A NaN as probability is not refused: the bisections then end at the
+   lower end of their bracket. docs/accuracy has the measured errors. The numbers of formulas are
+   those of M. Abramowitz and I. A. Stegun, Handbook of mathematical functions, 1964. */
 
 #include "qx/types.h"
 

@@ -39,7 +39,8 @@ QX_API ErrorCode CxOXFFTH(QX_IN CDB1D in, QX_OUT CDB1D out, QX_INOUT PlanSlot *s
 
 /** The transform X[k] = sum over j of x[j] exp(-2 pi i j k / n), k from 0 to n-1, unscaled, of the
     n = `size` values x of `in` from `offset` on, with zeros behind its end; `out` gets X, in
-    shifted order if `shift` is non-zero. The offset is not checked: it must not be negative.
+    shifted order if `shift` is non-zero. Any offset is taken: values before the start of `in` count
+    as zero, too.
     Codes: ErrEmptyInput (in is empty), ErrFFTSizeNotPositive (size below 1), ErrOutOfMemory (no
     memory), the host's status. */
 QX_API ErrorCode CxOXFFTH80(QX_IN CDB1D in, QX_OUT CDB1D out, QX_INOUT PlanSlot *slot,

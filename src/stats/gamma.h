@@ -5,10 +5,14 @@ namespace qx {
 
 // The gamma family. A fault of the domain gives NaN; there is no status.
 //
-// The rational approximations, with their intervals, are those of W. J. Cody and K. E. Hillstrom
-// (Chebyshev approximations for the natural logarithm of the gamma function, 1967) and of
-// Stirling's series; the continued fractions those of M. Abramowitz and I. A. Stegun (Handbook of
-// mathematical functions, 1964), 6.5.31, 26.5.8 and 26.5.9.
+// The coefficients are given; their author is not known. They approximate
+//   Gamma(2 + t), t from 0 to 1              relative error 1.3e-17
+//   ln Gamma(2 + t), t from 0 to 1           relative error 2.8e-17
+//   Stirling's series from x = 33 on         error 1.2e-17 (the factor), 1e-18 (its logarithm)
+// before rounding, as measured with mpmath. The continued fraction of Q(a, x) is
+// (1 - (1-a)/(x+2-a -) 1(2-a)/(x+4-a -) 2(3-a)/(x+6-a -) ...) / x, times exp(-x) x^a / Gamma(a);
+// those of the incomplete beta function are 26.5.8 and 26.5.9 of M. Abramowitz and I. A. Stegun,
+// Handbook of mathematical functions, 1964.
 
 // Horner's rule: coef[0] x^degree + ... + coef[degree].
 double PolyEval(double x, const double *coef, int degree);
