@@ -4,6 +4,8 @@
 /* Every export of the module. */
 
 #include "qx/anova.h"
+#include "qx/convolution.h"
+#include "qx/convolution_2d.h"
 #include "qx/distributions.h"
 #include "qx/errors.h"
 #include "qx/fft.h"

@@ -256,6 +256,8 @@ enum Quirk : unsigned {
     HostStatusInResult = 128,
     // The code stands in *err and is the function result as well.
     CodeInBoth = 256,
+    // A refused resize is a success.
+    RefusalPasses = 512,
 };
 
 struct Recipe {

@@ -1,0 +1,67 @@
+#ifndef QX_CONVOLUTION_H
+#define QX_CONVOLUTION_H
+
+/* Linear convolution, correlation and deconvolution of sequences and of matrices.
+
+   The caller chooses the algorithm, 0 direct summation or 1 transforms; no size switches it. The
+   direct form is exact to the rounding of each sum and keeps infinities and NaN where they belong;
+   transforms cost n log n and leave an error relative to the greatest value.
+
+   Normalization of a correlation, with m the smaller and M the greater length: 0 none, 1 unbiased
+   (each lag divided by the number of its terms), 2 biased (all divided by M). */
+
+#include "qx/types.h"
+
+QX_BEGIN_DECLS
+
+/** out[t] = sum over i of x[i] y[t - i], nx + ny - 1 values. The code is in *err. Any other
+    algorithm is a success that leaves in out what stands there.
+    Codes: ErrEmptyInput (x or y is empty), ErrOutOfMemory (the host refuses the output, or no
+    memory). A failure empties out. */
+QX_API int32_t Convolution(QX_IN DBL1D x, QX_IN DBL1D y, QX_OUT DBL1D out,
+                           QX_IN const int32_t *algorithm, QX_OUT ErrorCode *err);
+
+/** Complex convolution or, with `correlate` non-zero, correlation: out[t] = sum over i of
+    conj(x[nx - 1 - i]) y[t - i], element nx - 1 being lag zero, normalized as asked. Convolution
+    ignores the normalization.
+    Codes: ErrEmptyInput (x or y is empty; out stays as it is), the host's status (it refuses the
+    output), ErrInvalidSelector (no such normalization of a correlation, or no such algorithm),
+    ErrOutOfMemory (no memory). All but the first empty out. */
+QX_API ErrorCode CxConvolution(QX_IN CDB1D x, QX_IN CDB1D y, QX_OUT CDB1D out, int32_t algorithm,
+                               int32_t correlate, int32_t normalization);
+
+/** Cross-correlation: out[t] = sum over j of x[nx - 1 - t + j] y[j], nx + ny - 1 values, element nx
+    - 1 being lag zero. The code is in *err. Any other algorithm leaves in out what stands there,
+    normalized. An array with itself takes two transforms in place of three.
+    Codes: ErrEmptyInput (x or y is empty), ErrOutOfMemory (the host refuses the output, or no
+    memory), ErrInvalidSelector (no such normalization). A failure empties out. */
+QX_API int32_t Rxy80(QX_IN DBL1D x, QX_IN DBL1D y, QX_OUT DBL1D out, QX_IN const int32_t *algorithm,
+                     int32_t normalization, QX_OUT ErrorCode *err);
+/** As Rxy80, without a normalization.
+    Codes: ErrEmptyInput (x or y is empty), ErrOutOfMemory (the host refuses the output, or no
+    memory). A failure empties out. */
+QX_API int32_t Rxy(QX_IN DBL1D x, QX_IN DBL1D y, QX_OUT DBL1D out, QX_IN const int32_t *algorithm,
+                   QX_OUT ErrorCode *err);
+
+/** Replaces x by its autocorrelation, 2 n - 1 values with lag zero in the middle, always by
+    transforms. The code is in *err. x is never emptied: where the host refuses the greater size,
+    the call succeeds, the size is the new one, and as much of the result is written as the block
+    of n values holds.
+    Codes: ErrEmptyInput (x is empty), ErrOutOfMemory (no memory), ErrInvalidSelector (no such
+    normalization; the result stands, unnormalized). */
+QX_API int32_t AutoCorrelation80(QX_INOUT DBL1D x, int32_t normalization, QX_OUT ErrorCode *err);
+/** As AutoCorrelation80, without a normalization.
+    Codes: ErrEmptyInput (x is empty), ErrOutOfMemory (no memory). */
+QX_API int32_t AutoCorrelation(QX_INOUT DBL1D x, QX_OUT ErrorCode *err);
+
+/** Replaces xy by q, nxy - ny + 1 values, with xy = q convolved with y: by division of the spectra,
+    or, if that of y looks singular, by long division of the series, which leading zeros of y do not
+    disturb. What is no multiple of y leaves its remainder in q. The code is in *err and the
+   function result. Codes: ErrLengthTooLarge (an input of more than 8388608 values), ErrEmptyInput
+   (xy or y is empty), ErrSizesDisagree (y is the longer one), ErrOutOfMemory (no memory). A failure
+   empties xy. */
+QX_API int32_t Deconvolution(QX_INOUT DBL1D xy, QX_IN DBL1D y, QX_OUT ErrorCode *err);
+
+QX_END_DECLS
+
+#endif

@@ -1,0 +1,32 @@
+#ifndef QX_SPECTRA_RECURSION_H
+#define QX_SPECTRA_RECURSION_H
+
+#include "frame/elements.h"
+
+#include <cmath>
+#include <cstdint>
+
+namespace qx {
+
+// A part of a value that runs through a recursion: what is not above the smallest normal number in
+// magnitude becomes 0.0, so that a decaying response does not linger on denormals. NaN passes.
+inline double Flush(double value) {
+    return std::fabs(value) <= 2.2250738585072014e-308 ? 0.0 : value;
+}
+
+// The recursive half of a direct-form filter, and the division of one power series by another, in
+// place:
+//
+//     y[t] = flush((y[t] - a[na-1] y[t-na+1] - ... - a[1] y[t-1]) / a[0])
+//
+// in this order of subtraction. `history` holds the na - 1 values before y[0], the newest last, and
+// is brought up to date. A complex division multiplies by the conjugate of a[0] and divides by its
+// squared magnitude.
+void RunRecursion(const DBL *a, int32_t na, DBL *history, DBL *y, int32_t n);
+void RunRecursion(const CDB *a, int32_t na, CDB *history, CDB *y, int32_t n);
+// Real coefficients for complex values.
+void RunRecursion(const DBL *a, int32_t na, CDB *history, CDB *y, int32_t n);
+
+} // namespace qx
+
+#endif

@@ -1,0 +1,58 @@
+#ifndef QX_SPECTRA_SLIDING_SUMS_H
+#define QX_SPECTRA_SLIDING_SUMS_H
+
+#include "frame/elements.h"
+#include "frame/widths.h"
+
+#include <cstddef>
+#include <cstdint>
+
+namespace qx {
+
+// Sums of products over a window that slides along a signal: the inside of every direct
+// convolution, correlation and FIR filter,
+//
+//     out[t] = 0.0 + taps[0] signal[first + t] + taps[1] signal[first + t + 1] + ...
+//
+// with the terms added in this order. Taps, signal and output each have a step, which may be
+// negative; an order of summation that walks the other way is a matter of steps. Terms beyond the
+// ends of the signal are left out. The output may lie on the signal if none of the windows that
+// begin at t or before holds the place of out[t], its own last value excepted.
+//
+// A complex term a b adds (a.re b.re - a.im b.im) to the real sum and (a.im b.re + a.re b.im) to
+// the imaginary one.
+
+template <ElementType Code>
+struct Steps {
+    typename Element<Code>::type *at;
+    std::ptrdiff_t step = 1;
+};
+template <ElementType Code>
+struct ConstantSteps {
+    const typename Element<Code>::type *at;
+    std::ptrdiff_t step = 1;
+};
+
+template <ElementType Code>
+struct SlidingJob {
+    ConstantSteps<Code> taps;
+    int32_t tapCount;
+    ConstantSteps<Code> signal;
+    int64_t length;
+    int64_t first;
+    Steps<Code> out;
+    int32_t count;
+    bool continues = false; // the sums go on from what stands in the output
+};
+
+void SlidingSums(const SlidingJob<ElementType::DBL> &job);
+void SlidingSums(const SlidingJob<ElementType::CDB> &job);
+
+// The same in lanes. Zeros stand for what lies beyond the signal, so that the taps must be finite
+// if a window reaches there: 0 times such a tap adds nothing to a sum that began with 0.0.
+QX_BY_WIDTH(void, SlidingSumsInLanes, (const SlidingJob<ElementType::DBL> &job))
+QX_BY_WIDTH(void, ComplexSlidingSumsInLanes, (const SlidingJob<ElementType::CDB> &job))
+
+} // namespace qx
+
+#endif
