@@ -32,6 +32,9 @@ void CriticalSectionLeave(void *section);
 // Never 0.
 uintptr_t CurrentThread();
 
+// Lets other threads run.
+void Yield();
+
 // Module look-up; nothing is ever loaded. A module is an opaque handle, null for none.
 void *MainModule();
 void *LoadedModule(const char *name);

@@ -3,6 +3,7 @@
 #include <dlfcn.h>
 #include <link.h>
 #include <pthread.h>
+#include <sched.h>
 #include <sys/uio.h>
 #include <unistd.h>
 
@@ -40,6 +41,8 @@ void CriticalSectionEnter(void *section) { pthread_mutex_lock(AsMutex(section));
 void CriticalSectionLeave(void *section) { pthread_mutex_unlock(AsMutex(section)); }
 
 uintptr_t CurrentThread() { return static_cast<uintptr_t>(pthread_self()); }
+
+void Yield() { sched_yield(); }
 
 void *MainModule() { return dlopen(nullptr, RTLD_NOW | RTLD_NOLOAD); }
 

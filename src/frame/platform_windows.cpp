@@ -29,6 +29,8 @@ void CriticalSectionLeave(void *section) { LeaveCriticalSection(AsSection(sectio
 
 uintptr_t CurrentThread() { return GetCurrentThreadId(); }
 
+void Yield() { Sleep(0); }
+
 void *MainModule() { return GetModuleHandleA(nullptr); }
 
 void *LoadedModule(const char *name) { return GetModuleHandleA(name); }

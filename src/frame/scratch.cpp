@@ -31,9 +31,7 @@ struct HeapTable {
 HeapTable heapTable;
 std::atomic<int32_t> defaultMode = 0;
 
-Mode ModeOfNewBlock() {
-    if (analysisWorkspace.isEnabled())
-        return Workspace;
+Mode DefaultMode() {
     int32_t mode = defaultMode.load(std::memory_order_relaxed);
     if (mode == 0) {
         mode = PlainHeap;
@@ -42,18 +40,23 @@ Mode ModeOfNewBlock() {
     return static_cast<Mode>(mode);
 }
 
+Mode ModeOfNewBlock() { return analysisWorkspace.isEnabled() ? Workspace : DefaultMode(); }
+
 bool IsTooLarge(int32_t size) {
     return size < 0 || size > std::numeric_limits<int32_t>::max() - frontSize;
 }
 
-void *TakeFrom(Mode mode, int32_t total) {
-    const auto bytes = static_cast<std::size_t>(total);
+// A block from the mode's source, or null. A region that was given back since the mode was chosen
+// has the heap in its place.
+void *TakeFrom(Mode &mode, int32_t total) {
     if (mode == Workspace) {
         // Exhaustion reaches the caller as a null pointer, like every other failure.
         void *payload;
-        analysisWorkspace.allocate(total, &payload);
-        return payload;
+        if (analysisWorkspace.allocate(total, &payload) != ErrWorkspaceNotInitialized)
+            return payload;
+        mode = DefaultMode();
     }
+    const auto bytes = static_cast<std::size_t>(total);
     return mode == TableHeap ? heapTable.allocate(bytes) : std::malloc(bytes);
 }
 
@@ -96,7 +99,7 @@ ErrorCode ScratchAlloc(void **block, int32_t size) {
     *block = nullptr;
     if (IsTooLarge(size))
         return ErrOutOfMemory;
-    const Mode mode = ModeOfNewBlock();
+    Mode mode = ModeOfNewBlock();
     const int32_t total = size + frontSize;
     auto *front = static_cast<FrontHeader *>(TakeFrom(mode, total));
     if (front == nullptr)

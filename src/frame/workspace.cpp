@@ -4,10 +4,11 @@
 #include "frame/platform.h"
 #include "frame/scratch.h"
 
+#include <algorithm>
+#include <bit>
 #include <cstdlib>
 #include <cstring>
 #include <limits>
-#include <type_traits>
 
 namespace qx {
 
@@ -17,17 +18,26 @@ namespace {
 
 // What stands before a payload. Blocks start at any byte, so no word here can be an atomic one:
 // a locked access that crosses a cache line costs a hundred times as much as one that does not,
-// and kernels throttle it. Only the byte is atomic. The left neighbour writes runStart and then
-// sets the byte; who finds the byte set may read runStart.
+// and kernels throttle it. Only the byte is atomic: that of a block in a unit holds the number of
+// its chunk, that of a block in the stack whether the left neighbour has been released. The
+// neighbour writes runStart and then sets the byte; who finds it set may read runStart.
 struct __attribute__((packed)) BlockHeader {
-    unsigned char leftIsReleased;
+    unsigned char mark;
     uint32_t runStart; // start of the run of released blocks that ends at this block
     uint32_t end;      // where the next block starts
 };
 static_assert(sizeof(BlockHeader) == AnalysisWorkspace::blockOverhead);
 
+constexpr unsigned char inStack = 0;
+constexpr unsigned char leftIsReleased = 1;
+constexpr unsigned char inChunk = 2; // and above: 2 more than the chunk's number
+
+std::atomic_ref<unsigned char> Mark(BlockHeader *header) {
+    return std::atomic_ref<unsigned char>(header->mark);
+}
+
 // The reservation is longer than the region by one header, since the last block, too, leaves
-// word at its end.
+// word at its end. Below a lowered ceiling the same room is kept.
 constexpr uint64_t reservationOverhead = sizeof(BlockHeader);
 
 BlockHeader *HeaderAt(unsigned char *base, uint32_t offset) {
@@ -37,6 +47,25 @@ BlockHeader *HeaderAt(unsigned char *base, uint32_t offset) {
 uint32_t OffsetOfPayload(const unsigned char *base, const void *payload) {
     return static_cast<uint32_t>(static_cast<const unsigned char *>(payload) - base -
                                  AnalysisWorkspace::blockOverhead);
+}
+
+// Bits `first` to `first + count - 1`.
+constexpr uint64_t MaskOf(uint32_t first, uint32_t count) {
+    return (count < 64 ? (uint64_t{1} << count) - 1 : ~uint64_t{0}) << first;
+}
+
+// The highest run of so many zero bits, or false.
+bool FindRun(uint64_t used, uint32_t count, uint32_t *first) {
+    uint64_t starts = ~used;
+    for (uint32_t have = 1; have < count && starts != 0;) {
+        const uint32_t more = std::min(have, count - have);
+        starts &= starts >> more;
+        have += more;
+    }
+    if (starts == 0)
+        return false;
+    *first = 63 - static_cast<uint32_t>(std::countl_zero(starts));
+    return true;
 }
 
 int32_t SweepWorkspace(void *) {
@@ -78,44 +107,139 @@ ErrorCode AnalysisWorkspace::checkOwner() const {
     return owner == 0 || owner == platform::CurrentThread() ? 0 : ErrWorkspaceWrongThread;
 }
 
+int32_t AnalysisWorkspace::liveBlocks() const {
+    const State now = unpack(state_.load(std::memory_order_acquire));
+    if (now.live == noRegion)
+        return -1;
+    // Blocks in units are not counted; a chunk is at least one.
+    uint32_t all = now.live;
+    for (const Chunk &chunk : chunks_)
+        all += chunk.usedCells.load(std::memory_order_acquire) != 0;
+    return static_cast<int32_t>(all);
+}
+
+uint32_t AnalysisWorkspace::bump() const {
+    const State now = unpack(state_.load(std::memory_order_acquire));
+    return now.isFull ? limit_.load(std::memory_order_relaxed) : now.bump;
+}
+
 ErrorCode AnalysisWorkspace::allocate(int64_t size, void **payload) {
     *payload = nullptr;
     if (const ErrorCode status = checkOwner())
         return status;
 
-    uint64_t seen = state_.load(std::memory_order_acquire);
-    State now;
-    uint64_t end;
-    bool fits;
-    do {
-        now = unpack(seen);
-        end = now.bump + static_cast<uint64_t>(size) + blockOverhead;
-        fits = end < limit_;
-        // A request that does not fit leaves the region full until the last live block goes.
-        const State next =
-            fits ? State{static_cast<uint32_t>(end), now.live + 1} : State{limit_, now.live};
-        if (state_.compare_exchange_weak(seen, pack(next), std::memory_order_acq_rel,
-                                         std::memory_order_acquire))
-            break;
-    } while (true);
-    if (!fits)
-        return ErrWorkspaceExhausted;
+    const uint64_t total = static_cast<uint64_t>(size) + blockOverhead;
+    const uintptr_t thread = platform::CurrentThread();
+    const State now = unpack(state_.load(std::memory_order_acquire));
+    if (now.live == noRegion)
+        return ErrWorkspaceNotInitialized;
+    const bool isOurs = now.live == 0 || stackOwner_.load(std::memory_order_relaxed) == thread;
+    // A stack that has grown long beside used units is left to run empty.
+    const bool isLong = now.isShared && now.bump > limit_.load(std::memory_order_relaxed) / 4;
+    const bool stackFirst = isOurs && !isLong;
+    if ((stackFirst && allocateInStack(total, thread, payload)) ||
+        allocateInUnits(total, thread, payload) ||
+        (!stackFirst && allocateInStack(total, thread, payload)))
+        return 0;
+    markFull(total);
+    return ErrWorkspaceExhausted;
+}
 
-    BlockHeader *header = HeaderAt(base_, now.bump);
-    std::atomic_ref<unsigned char>(header->leftIsReleased).store(0, std::memory_order_relaxed);
-    header->end = static_cast<uint32_t>(end);
-    *payload = header + 1;
-    return 0;
+void *AnalysisWorkspace::place(uint32_t chunk, uint32_t start, uint32_t end) {
+    BlockHeader *header = HeaderAt(base_, start);
+    Mark(header).store(static_cast<unsigned char>(chunk), std::memory_order_relaxed);
+    header->end = end;
+    return header + 1;
 }
 
 void AnalysisWorkspace::release(void *payload) {
-    const uint32_t block = OffsetOfPayload(base_, payload);
-    BlockHeader *header = HeaderAt(base_, block);
+    unsigned char *base = base_;
+    const uint32_t block = OffsetOfPayload(base, payload);
+    BlockHeader *header = HeaderAt(base, block);
+    const unsigned char mark = Mark(header).load(std::memory_order_relaxed);
+    if (mark < inChunk) {
+        releaseInStack(base, block);
+        return;
+    }
+    const uint32_t index = mark - inChunk;
+    const uint32_t unit = limit_.load(std::memory_order_relaxed) / units;
+    const uint32_t cell = unit / units;
+    uint64_t cells = ~uint64_t{0};
+    if (cell > 0 && header->end - block <= unit)
+        cells = MaskOf((block - index * unit) / cell, (header->end - block) / cell);
+    releaseCells(index, cells);
+}
+
+// The stack.
+
+// Whether a block may end there. The limit is read anew at each call: before a compare-exchange it
+// may be that of a region which has gone, and after one the block holds the region.
+bool AnalysisWorkspace::fitsStack(uint64_t end, uint32_t ceiling) const {
+    const uint32_t limit = limit_.load(std::memory_order_relaxed);
+    return ceiling == units ? end < limit
+                            : end + blockOverhead <= uint64_t{ceiling} * (limit / units);
+}
+
+// Puts a block onto the stack; `before` tells what the stack was.
+bool AnalysisWorkspace::push(uint64_t total, State *before) {
+    uint64_t seen = state_.load(std::memory_order_acquire);
+    State next;
+    do {
+        next = *before = unpack(seen);
+        if (before->isFull || before->live >= noRegion - 1 ||
+            !fitsStack(before->bump + total, before->ceiling))
+            return false;
+        next.bump = static_cast<uint32_t>(before->bump + total);
+        ++next.live;
+    } while (!state_.compare_exchange_weak(seen, pack(next), std::memory_order_acq_rel,
+                                           std::memory_order_acquire));
+    if (fitsStack(next.bump, next.ceiling))
+        return true;
+    // The region was replaced by a smaller one between the two looks.
+    takeBack(before->bump, next.bump);
+    return false;
+}
+
+bool AnalysisWorkspace::allocateInStack(uint64_t total, uintptr_t thread, void **payload) {
+    State before;
+    while (!push(total, &before))
+        if (!raiseCeiling())
+            return false;
+    if (before.live == 0)
+        stackOwner_.store(thread, std::memory_order_relaxed);
+    *payload = place(inStack, before.bump, static_cast<uint32_t>(before.bump + total));
+    return true;
+}
+
+namespace {
+
+// The stack with one live block less, fallen back to `bump`; without one it is idle.
+template <class State>
+State WithoutOne(State now, uint32_t bump) {
+    if (now.live == 1)
+        return {0, 0, now.ceiling, false, false};
+    return {bump, now.live - 1, now.ceiling, now.isFull, now.isShared};
+}
+
+} // namespace
+
+// Undoes a push that nothing was written for. Who pushed behind it from the same old look is
+// about to do the same.
+void AnalysisWorkspace::takeBack(uint32_t start, uint32_t end) {
+    uint64_t seen = state_.load(std::memory_order_acquire);
+    do {
+        while (unpack(seen).bump != end)
+            seen = state_.load(std::memory_order_acquire);
+    } while (!state_.compare_exchange_weak(seen, pack(WithoutOne(unpack(seen), start)),
+                                           std::memory_order_acq_rel, std::memory_order_acquire));
+}
+
+void AnalysisWorkspace::releaseInStack(unsigned char *base, uint32_t block) {
+    BlockHeader *header = HeaderAt(base, block);
     const uint32_t end = header->end;
     const auto runStart = [&] {
-        const bool leftIsReleased =
-            std::atomic_ref<unsigned char>(header->leftIsReleased).load(std::memory_order_acquire);
-        return leftIsReleased ? header->runStart : block;
+        const bool left = Mark(header).load(std::memory_order_acquire) == leftIsReleased;
+        return left ? header->runStart : block;
     };
 
     bool leftWord = false;
@@ -123,26 +247,154 @@ void AnalysisWorkspace::release(void *payload) {
     State next;
     do {
         const State now = unpack(seen);
-        if (now.live == 1) {
-            next = {0, 0};
-        } else if (now.bump == end && !leftWord) {
-            next = {runStart(), now.live - 1};
-        } else {
-            if (!leftWord) {
+        uint32_t bump = now.bump;
+        if (now.live > 1 && !leftWord) {
+            if (now.bump == end) {
+                bump = runStart();
+            } else {
                 // Nobody can go below `end` before this block has left the count, so the next
                 // block, there or to come, starts at `end`.
-                BlockHeader *right = HeaderAt(base_, end);
+                BlockHeader *right = HeaderAt(base, end);
                 right->runStart = runStart();
-                std::atomic_ref<unsigned char>(right->leftIsReleased)
-                    .store(1, std::memory_order_release);
+                Mark(right).store(leftIsReleased, std::memory_order_release);
                 // From here on the right neighbour may give these bytes back, and they may
                 // belong to another block: this one may only leave the count.
                 leftWord = true;
             }
-            next = {now.bump, now.live - 1};
         }
+        next = WithoutOne(now, bump);
     } while (!state_.compare_exchange_weak(seen, pack(next), std::memory_order_acq_rel,
                                            std::memory_order_acquire));
+}
+
+// A request that does not fit leaves the region full until the last live block goes. So it is for
+// one thread; beside used units room comes back sooner.
+void AnalysisWorkspace::markFull(uint64_t total) {
+    uint64_t seen = state_.load(std::memory_order_acquire);
+    State now;
+    do {
+        now = unpack(seen);
+        if (now.live == 0 || now.live == noRegion || now.isShared || now.ceiling != units ||
+            fitsStack(now.bump + total, now.ceiling))
+            return;
+        now.isFull = true;
+    } while (!state_.compare_exchange_weak(seen, pack(now), std::memory_order_acq_rel,
+                                           std::memory_order_acquire));
+}
+
+// Units and cells.
+
+bool AnalysisWorkspace::allocateInUnits(uint64_t total, uintptr_t thread, void **payload) {
+    const uint32_t limit = limit_.load(std::memory_order_relaxed);
+    const uint32_t unit = limit / units;
+    const uint32_t cell = unit / units;
+    if (unit == 0 || total > uint64_t{unit} * units)
+        return false;
+    const bool isSmall = cell > 0 && total <= uint64_t{cell} * units;
+    const auto cells = static_cast<uint32_t>(isSmall ? (total + cell - 1) / cell : units);
+    std::atomic<uint8_t> &latest =
+        latestChunk_[(thread >> 6 ^ thread >> 12 ^ thread >> 18) % units];
+
+    uint32_t index = latest.load(std::memory_order_relaxed);
+    uint32_t first = 0;
+    bool found = isSmall && takeCells(index, cells, &first);
+    for (uint32_t i = units; isSmall && !found && i-- > 0;)
+        if ((found = takeCells(i, cells, &first)))
+            index = i;
+    if (!found) {
+        const auto count = static_cast<uint32_t>(isSmall ? 1 : (total + unit - 1) / unit);
+        if (!takeUnits(count, unit, &index))
+            return false;
+        chunks_[index].count.store(count, std::memory_order_relaxed);
+        first = isSmall ? units - cells : 0;
+        chunks_[index].usedCells.store(MaskOf(first, cells), std::memory_order_release);
+    }
+    // The cells hold the region from here on; it may be another one than at the start.
+    if (limit_.load(std::memory_order_relaxed) != limit) {
+        releaseCells(index, MaskOf(first, cells));
+        return false;
+    }
+    latest.store(static_cast<uint8_t>(index), std::memory_order_relaxed);
+    const uint32_t start = index * unit + first * cell;
+    const uint32_t size = isSmall ? cells * cell : static_cast<uint32_t>(total);
+    *payload = place(index + inChunk, start, start + size);
+    return true;
+}
+
+// So many cells side by side of a chunk that has used ones.
+bool AnalysisWorkspace::takeCells(uint32_t index, uint32_t count, uint32_t *first) {
+    std::atomic<uint64_t> &word = chunks_[index].usedCells;
+    uint64_t used = word.load(std::memory_order_acquire);
+    do {
+        if (used == 0 || !FindRun(used, count, first))
+            return false;
+    } while (!word.compare_exchange_weak(used, used | MaskOf(*first, count),
+                                         std::memory_order_acq_rel, std::memory_order_acquire));
+    return true;
+}
+
+void AnalysisWorkspace::releaseCells(uint32_t index, uint64_t cells) {
+    // The chunk ends with its last cell, after which its count may be another's.
+    const uint32_t count = chunks_[index].count.load(std::memory_order_relaxed);
+    if (chunks_[index].usedCells.fetch_and(~cells, std::memory_order_acq_rel) == cells)
+        releaseUnits(index, count);
+}
+
+// So many units side by side: free ones, or from the end of the stack's.
+bool AnalysisWorkspace::takeUnits(uint32_t count, uint32_t unit, uint32_t *first) {
+    uint64_t used = usedUnits_.load(std::memory_order_acquire);
+    while (FindRun(used, count, first))
+        if (usedUnits_.compare_exchange_weak(used, used | MaskOf(*first, count),
+                                             std::memory_order_acq_rel, std::memory_order_acquire))
+            return true;
+
+    raiseCeiling();
+    uint64_t seen = state_.load(std::memory_order_acquire);
+    State next;
+    do {
+        const State now = unpack(seen);
+        if (now.live == noRegion || now.isFull || now.ceiling < count)
+            return false;
+        next = now;
+        next.ceiling -= count;
+        next.isShared = now.live > 0;
+        if (now.bump + uint64_t{blockOverhead} > uint64_t{next.ceiling} * unit)
+            return false;
+    } while (!state_.compare_exchange_weak(seen, pack(next), std::memory_order_acq_rel,
+                                           std::memory_order_acquire));
+    *first = next.ceiling;
+    return true;
+}
+
+void AnalysisWorkspace::releaseUnits(uint32_t first, uint32_t count) {
+    usedUnits_.fetch_and(~MaskOf(first, count), std::memory_order_acq_rel);
+}
+
+// Gives the stack the free units at its end; whether there were any.
+bool AnalysisWorkspace::raiseCeiling() {
+    const uint32_t from = unpack(state_.load(std::memory_order_acquire)).ceiling;
+    if (from == units)
+        return false;
+    uint64_t used = usedUnits_.load(std::memory_order_acquire);
+    uint32_t count;
+    do {
+        count = std::min(static_cast<uint32_t>(std::countr_zero(used >> from)), units - from);
+        if (count == 0)
+            return false;
+    } while (!usedUnits_.compare_exchange_weak(
+        used, used | MaskOf(from, count), std::memory_order_acq_rel, std::memory_order_acquire));
+    uint64_t seen = state_.load(std::memory_order_acquire);
+    State next;
+    do {
+        next = unpack(seen);
+        if (next.ceiling != from) { // lowered meanwhile, or raised by another
+            releaseUnits(from, count);
+            return false;
+        }
+        next.ceiling += count;
+    } while (!state_.compare_exchange_weak(seen, pack(next), std::memory_order_acq_rel,
+                                           std::memory_order_acquire));
+    return true;
 }
 
 ErrorCode AnalysisWorkspace::resize(void **payload, int64_t size) {
@@ -167,52 +419,88 @@ ErrorCode AnalysisWorkspace::resize(void **payload, int64_t size) {
     return status;
 }
 
+// The four operations change the region one at a time: who finds the phase Ready, or None, and
+// makes it Changing has the region to himself, but for the requests.
+
 ErrorCode AnalysisWorkspace::reserve(uint32_t size) {
-    if (liveBlocks() != -1)
+    Phase found = Phase::None;
+    if (!phase_.compare_exchange_strong(found, Phase::Changing))
         return ErrWorkspaceAlreadyInitialized;
     const uint64_t reservation = size + reservationOverhead;
-    if (reservation > std::numeric_limits<std::size_t>::max())
+    void *region = reservation > std::numeric_limits<std::size_t>::max()
+                       ? nullptr
+                       : std::malloc(static_cast<std::size_t>(reservation));
+    if (region == nullptr) {
+        phase_.store(Phase::None);
         return ErrOutOfMemory;
-    void *region = std::malloc(static_cast<std::size_t>(reservation));
-    if (region == nullptr)
-        return ErrOutOfMemory;
+    }
     base_ = static_cast<unsigned char *>(region);
-    limit_ = size;
-    state_.store(pack({0, 0}), std::memory_order_release);
+    limit_.store(size, std::memory_order_relaxed);
+    usedUnits_.store(~uint64_t{0}, std::memory_order_release);
+    state_.store(pack(idle), std::memory_order_release);
     HostRegisterSweep(SweepWorkspace, nullptr, SweepForProcess);
+    phase_.store(Phase::Ready);
     return 0;
 }
 
 ErrorCode AnalysisWorkspace::giveBack() {
-    const int32_t live = liveBlocks();
-    if (live == -1)
-        return 0;
-    if (live > 0)
-        return ErrWorkspaceStillInUse;
-    if (isEnabled())
-        return ErrWorkspaceStillEnabled;
+    Phase found = Phase::Ready;
+    if (!phase_.compare_exchange_strong(found, Phase::Changing))
+        return 0; // there is none, or another thread is making or ending it
+    while (raiseCeiling())
+        continue;
+    ErrorCode status = 0;
+    uint64_t expected = pack(idle);
+    if (liveBlocks() > 0)
+        status = ErrWorkspaceStillInUse;
+    else if (enabled_.load())
+        status = ErrWorkspaceStillEnabled;
+    else if (!state_.compare_exchange_strong(expected, pack(absent)))
+        status = ErrWorkspaceStillInUse; // units or a block are on their way
+    if (status != 0) {
+        phase_.store(Phase::Ready);
+        return status;
+    }
+    endRegion();
+    return 0;
+}
+
+void AnalysisWorkspace::endRegion() {
     HostRegisterSweep(SweepWorkspace, nullptr, SweepWithdraw);
     unsigned char *region = base_;
     base_ = nullptr;
-    limit_ = 0;
-    state_.store(pack({0, -1}), std::memory_order_release);
+    limit_.store(0, std::memory_order_relaxed);
     std::free(region);
-    return 0;
+    phase_.store(Phase::None);
+}
+
+AnalysisWorkspace::Phase AnalysisWorkspace::settledPhase() const {
+    Phase found;
+    while ((found = phase_.load()) == Phase::Changing)
+        platform::Yield();
+    return found;
 }
 
 ErrorCode AnalysisWorkspace::setEnabled(bool enable) {
-    if (liveBlocks() == -1)
+    if (settledPhase() == Phase::None)
         return ErrWorkspaceNotInitialized;
-    enabled_.store(enable, std::memory_order_relaxed);
-    return 0;
+    enabled_.store(enable);
+    // A give-back that has begun either saw the flag and leaves the region, or ends it.
+    if (settledPhase() == Phase::Ready)
+        return 0;
+    enabled_.store(false);
+    return ErrWorkspaceNotInitialized;
 }
 
 void AnalysisWorkspace::sweep() {
-    if (liveBlocks() == -1)
+    Phase found = Phase::Ready;
+    if (!phase_.compare_exchange_strong(found, Phase::Changing))
         return;
-    enabled_.store(false, std::memory_order_relaxed);
-    state_.store(pack({0, 0}), std::memory_order_release);
-    giveBack();
+    enabled_.store(false);
+    for (Chunk &chunk : chunks_)
+        chunk.usedCells.store(0, std::memory_order_release);
+    state_.store(pack(absent), std::memory_order_release);
+    endRegion();
 }
 
 } // namespace qx

@@ -12,19 +12,26 @@ namespace qx {
 // The analysis workspace: one region, reserved once, that serves every scratch request while it
 // is enabled, without a lock and without the heap.
 //
-// A block takes its payload and 9 bytes before it. Blocks lie side by side from `base` upward
-// in the order of the requests; `bump` is the end of the last one. A released block gives its
-// bytes back at once if it is the last, together with the run of released blocks before it;
-// otherwise it stays until such a run reaches it or until no block is live.
+// As long as one thread asks, its blocks stand in a stack from the bottom of the region. A block
+// takes its payload and 9 bytes before it, and blocks lie side by side in the order of the
+// requests; `bump` is the end of the last one. A released block gives its bytes back at once if it
+// is the last, together with the run of released blocks before it; otherwise it stays until such a
+// run reaches it or until no block is live.
 //
-// `bump` and `liveBlocks` change together, in one compare-exchange on one word. A block thus
-// counts as live from the moment it has its bytes to the moment it gives them back, and while
+// That is no rule for many threads, under whose blocks everybody else's would stay for ever. The
+// stack belongs to one thread from its first live block to its last, and a thread that comes
+// meanwhile takes its blocks from the top of the region: in units, 64th parts of the region, and
+// cells, 64th parts of a unit, which one bit each tells free or used. They are free again as soon
+// as they are released, wherever they lie. The stack ends below the lowest unit in use.
+//
+// `bump` and `live` of the stack change together, in one compare-exchange on one word. A block
+// thus counts as live from the moment it has its bytes to the moment it gives them back, and while
 // it is live `bump` cannot fall below its end: no other thread can place a block on top of it.
-// With two words that cannot be had. A block that was claimed but not counted could be swept by
-// a reset at zero, and one that had left word in its neighbour could fall back a second time.
+// A live block or a used unit also keeps the region from being given back.
 class AnalysisWorkspace {
 public:
-    // The result of the four operations of the exports.
+    // The result of the four operations of the exports. Any thread may call any of them at any
+    // time, also while others hold blocks.
     ErrorCode reserve(uint32_t size);
     ErrorCode giveBack();
     ErrorCode setEnabled(bool enable);
@@ -33,8 +40,9 @@ public:
 
     bool isEnabled() const { return enabled_.load(std::memory_order_relaxed); }
 
-    // A payload of `size` bytes: 0, ErrWorkspaceWrongThread or ErrWorkspaceExhausted with a null
-    // payload.
+    // A payload of `size` bytes: 0; with a null payload ErrWorkspaceWrongThread,
+    // ErrWorkspaceExhausted, or ErrWorkspaceNotInitialized where the region has just been given
+    // back.
     ErrorCode allocate(int64_t size, void **payload);
     void release(void *payload);
     // Keeps the block where the size fits; otherwise the old block is released in any case,
@@ -42,28 +50,68 @@ public:
     ErrorCode resize(void **payload, int64_t size);
 
     // -1 while no region exists.
-    int32_t liveBlocks() const { return unpack(state_.load(std::memory_order_acquire)).live; }
-    // Offset of the next free byte from the start of the region.
-    uint32_t bump() const { return unpack(state_.load(std::memory_order_acquire)).bump; }
+    int32_t liveBlocks() const;
+    // Offset of the next free byte of the stack from the start of the region.
+    uint32_t bump() const;
 
     static constexpr int32_t blockOverhead = 9;
 
 private:
+    static constexpr uint32_t units = 64; // of a region, and cells of a unit
+
     struct State {
         uint32_t bump;
-        int32_t live;
+        uint32_t live;
+        uint32_t ceiling; // the units below it are the stack's
+        bool isFull;      // a request was refused; lasts until no block is live
+        bool isShared;    // units have been taken since the stack was idle
     };
+    static constexpr uint32_t noRegion = 0x7FFFFF; // in place of a count
     static constexpr uint64_t pack(State state) {
-        return uint64_t{static_cast<uint32_t>(state.live)} << 32 | state.bump;
+        return uint64_t{state.isShared} << 63 | uint64_t{state.isFull} << 62 |
+               uint64_t{state.ceiling} << 55 | uint64_t{state.live} << 32 | state.bump;
     }
     static constexpr State unpack(uint64_t word) {
-        return {static_cast<uint32_t>(word), static_cast<int32_t>(word >> 32)};
+        return {static_cast<uint32_t>(word), static_cast<uint32_t>(word >> 32) & noRegion,
+                static_cast<uint32_t>(word >> 55) & 0x7F, (word >> 62 & 1) != 0, word >> 63 != 0};
     }
-    ErrorCode checkOwner() const;
+    static constexpr State idle = {0, 0, units, false, false};
+    static constexpr State absent = {0, noRegion, units, false, false};
 
-    std::atomic<uint64_t> state_ = pack({0, -1});
+    // Units that are used together: one whose cells serve many blocks, or several for one block,
+    // whose bits are then all set. Without a used cell it is none, and nobody may set one.
+    struct alignas(64) Chunk {
+        std::atomic<uint64_t> usedCells;
+        std::atomic<uint32_t> count; // of its units
+    };
+
+    enum class Phase { None, Changing, Ready };
+
+    ErrorCode checkOwner() const;
+    bool fitsStack(uint64_t end, uint32_t ceiling) const;
+    bool push(uint64_t total, State *before);
+    bool allocateInStack(uint64_t total, uintptr_t thread, void **payload);
+    void takeBack(uint32_t start, uint32_t end);
+    void releaseInStack(unsigned char *base, uint32_t block);
+    void markFull(uint64_t total);
+    bool allocateInUnits(uint64_t total, uintptr_t thread, void **payload);
+    bool takeCells(uint32_t index, uint32_t count, uint32_t *first);
+    bool takeUnits(uint32_t count, uint32_t unit, uint32_t *first);
+    void releaseCells(uint32_t index, uint64_t cells);
+    void releaseUnits(uint32_t first, uint32_t count);
+    bool raiseCeiling();
+    void *place(uint32_t chunk, uint32_t start, uint32_t end);
+    void endRegion();
+    Phase settledPhase() const;
+
+    std::atomic<uint64_t> state_ = pack(absent);
+    std::atomic<uintptr_t> stackOwner_ = 0;
+    std::atomic<uint64_t> usedUnits_ = ~uint64_t{0}; // the stack's count as used
+    Chunk chunks_[units] = {};                       // by their first unit
+    std::atomic<uint8_t> latestChunk_[units] = {};   // of the threads of a hash
+    std::atomic<uint32_t> limit_ = 0;                // offset from base_
     unsigned char *base_ = nullptr;
-    uint32_t limit_ = 0; // offset from base_, as every address inside the region
+    std::atomic<Phase> phase_ = Phase::None;
     std::atomic<bool> enabled_ = false;
     std::atomic<uintptr_t> ownerThread_ = 0; // nothing sets it
 };

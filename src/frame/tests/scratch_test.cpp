@@ -6,6 +6,7 @@
 
 #include <algorithm>
 #include <cstring>
+#include <functional>
 #include <limits>
 #include <random>
 #include <thread>
@@ -165,6 +166,10 @@ TEST(Workspace, ExhaustionLastsUntilTheLastLiveBlockGoes) {
     void *payload = &payload;
     EXPECT_EQ(analysisWorkspace.allocate(1000, &payload), ErrWorkspaceExhausted);
     EXPECT_EQ(payload, nullptr);
+    // No live block is to go, so the region is empty again at once.
+    void *afterRefusal = qx::ScratchAllocPointer(10);
+    EXPECT_EQ(afterRefusal, first);
+    qx::ScratchFree(afterRefusal);
 }
 
 TEST(Workspace, ReleasesInAnyOrderGiveEverythingBack) {
@@ -391,6 +396,134 @@ TEST(Workspace, ThreadsNeverShareAByte) {
     EXPECT_EQ(analysisWorkspace.liveBlocks(), 0);
     // A refusal is possible while dead runs lie between live blocks, but it must stay rare.
     EXPECT_LT(refusals, threads * rounds / 100);
+}
+
+// One thread's blocks of the scratch front: allocates, checks and releases at random, each block
+// filled with a pattern of its own.
+class Churn {
+public:
+    Churn(unsigned seed, std::size_t most, int32_t largest)
+        : random_(seed), most_(most), largest_(largest) {}
+    ~Churn() {
+        for (const Held &held : held_)
+            drop(held);
+    }
+    Churn(const Churn &) = delete;
+    Churn &operator=(const Churn &) = delete;
+
+    // One request or one release.
+    void step() {
+        if (held_.empty() || (held_.size() < most_ && random_() % 2 == 0)) {
+            const auto size = static_cast<int32_t>(8 + random_() % static_cast<unsigned>(largest_));
+            auto *bytes = static_cast<unsigned char *>(qx::ScratchAllocPointer(size));
+            if (bytes == nullptr) {
+                ++refusals;
+                return;
+            }
+            const auto mark = static_cast<unsigned char>(random_());
+            bytes[0] = bytes[size / 2] = bytes[size - 1] = mark;
+            held_.push_back({bytes, size, mark});
+        } else {
+            const std::size_t which = random_() % held_.size();
+            drop(held_[which]);
+            held_[which] = held_.back();
+            held_.pop_back();
+        }
+    }
+    int refusals = 0;
+    int faults = 0;
+
+private:
+    struct Held {
+        unsigned char *bytes;
+        int32_t size;
+        unsigned char mark;
+    };
+    void drop(const Held &held) {
+        for (const int32_t at : {0, held.size / 2, held.size - 1})
+            faults += held.bytes[at] != held.mark;
+        qx::ScratchFree(held.bytes);
+    }
+    std::mt19937 random_;
+    const std::size_t most_;
+    const int32_t largest_;
+    std::vector<Held> held_;
+};
+
+void RunThreads(int threads, const std::function<void(int)> &work) {
+    std::vector<std::thread> pool;
+    for (int i = 0; i < threads; ++i)
+        pool.emplace_back(work, i);
+    for (std::thread &thread : pool)
+        thread.join();
+}
+
+// Blocks that live side by side for ever, never all gone at once, in a region four times their
+// size: ten million requests and not one refusal.
+TEST(Workspace, RoomForFourTimesTheLiveDataNeverRunsOut) {
+    constexpr int threads = 8;
+    const EnabledRegion region(1 << 20);
+    for (const auto &[most, largest] : {std::pair{2, 400}, {8, 4000}}) {
+        std::atomic<int> refusals = 0;
+        std::atomic<int> faults = 0;
+        RunThreads(threads, [&](int seed) {
+            Churn churn(static_cast<unsigned>(seed), static_cast<std::size_t>(most), largest);
+            for (int i = 0; i < 1250000; ++i) // half of them requests, twice
+                churn.step();
+            refusals += churn.refusals;
+            faults += churn.faults;
+        });
+        EXPECT_EQ(refusals, 0) << most << " blocks of up to " << largest << " bytes a thread";
+        EXPECT_EQ(faults, 0);
+        EXPECT_EQ(analysisWorkspace.liveBlocks(), 0);
+    }
+    // The whole region serves one thread again.
+    void *all = qx::ScratchAllocPointer((1 << 20) - overhead - 1);
+    EXPECT_NE(all, nullptr);
+    qx::ScratchFree(all);
+}
+
+// Regions of changing sizes come and go, enabled and disabled by some threads, under the blocks of
+// others. No block is lost or shared, and in the end nothing is left.
+TEST(Workspace, MayBeGivenBackWhileOthersWork) {
+    constexpr int rounds = 1000000 / 8;
+    const int sweeps = qx::test::RegisteredSweeps();
+    std::atomic<int> faults = 0;
+    std::atomic<int> served = 0;
+    std::atomic<int> unexpected = 0;
+    RunThreads(8, [&](int seed) {
+        std::mt19937 random(static_cast<unsigned>(seed));
+        Churn churn(static_cast<unsigned>(seed), 3, 300);
+        for (int i = 0; i < rounds; ++i) {
+            if (seed % 2 == 0) {
+                churn.step();
+                served += analysisWorkspace.isEnabled();
+                continue;
+            }
+            ErrorCode code = 0;
+            switch (random() % 4) {
+            case 0:
+                code = analysisWorkspace.reserve(static_cast<uint32_t>(1 + random() % 20000));
+                break;
+            case 1:
+                code = analysisWorkspace.giveBack();
+                break;
+            default:
+                code = analysisWorkspace.setEnabled(random() % 2 == 0);
+            }
+            unexpected += code != 0 && code != ErrWorkspaceAlreadyInitialized &&
+                          code != ErrWorkspaceStillInUse && code != ErrWorkspaceStillEnabled &&
+                          code != ErrWorkspaceNotInitialized;
+        }
+        faults += churn.faults;
+    });
+    EXPECT_EQ(faults, 0);
+    EXPECT_EQ(unexpected, 0);
+    EXPECT_GT(served, 0) << "the region was never enabled beside a request";
+    analysisWorkspace.setEnabled(false);
+    EXPECT_EQ(analysisWorkspace.giveBack(), 0);
+    EXPECT_EQ(analysisWorkspace.liveBlocks(), -1);
+    EXPECT_EQ(qx::test::RegisteredSweeps(), sweeps);
 }
 
 } // namespace
