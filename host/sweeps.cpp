@@ -3,7 +3,9 @@
 #include "frame/platform.h"
 
 #include <cstdint>
+#include <map>
 #include <new>
+#include <unordered_map>
 
 namespace {
 
@@ -14,44 +16,53 @@ struct Sweep {
     void *argument;
     int32_t mode;
     uint64_t round; // the last run that has called it, or during which it was registered
-    Sweep *next;
 };
 
-// The registered sweeps, in the order of registration. A sweep is called with the lock released,
-// because it may register or withdraw others; a run therefore looks from the start each time for
-// one that it has not called yet.
+// The registered sweeps, by their numbers in the order of registration. A sweep is called with the
+// lock released, because it may register or withdraw others; a run therefore looks each time for
+// the next number that it has not called yet.
 class Registry {
 public:
     int32_t change(QXHostSweep procedure, void *argument, int32_t mode) {
         const Hold hold(lock_);
-        Sweep **link = find([=](const Sweep &sweep) {
-            return sweep.procedure == procedure && sweep.argument == argument;
-        });
+        auto [entry, end] = ofArgument_.equal_range(argument);
+        while (entry != end && sweeps_.at(entry->second).procedure != procedure)
+            ++entry;
+        const bool isKnown = entry != end;
         if (mode == Withdraw) {
-            if (*link != nullptr)
-                remove(link);
+            if (isKnown)
+                remove(entry);
             return QXHostDone;
         }
-        if (*link == nullptr)
-            *link = new (std::nothrow) Sweep{procedure, argument, mode, round_, nullptr};
-        if (*link == nullptr)
-            return QXHostNoMemory;
-        (*link)->mode = mode;
+        if (isKnown)
+            sweeps_.at(entry->second).mode = mode;
+        else
+            return add({procedure, argument, mode, round_});
         return QXHostDone;
     }
 
-    // Calls every sweep for which `applies` holds, once, and forgets those for objects.
-    template <class Condition>
-    int32_t run(Condition applies) {
+    // Calls every sweep once, and forgets those for objects.
+    int32_t runAll() {
         const uint64_t round = nextRound();
-        Sweep sweep;
+        uint64_t number = 0;
         int32_t called = 0;
-        for (; take(round, applies, sweep); ++called)
+        for (Sweep sweep; takeFrom(number, round, sweep); ++called)
+            sweep.procedure(sweep.argument);
+        return called;
+    }
+
+    // The same for those of one object.
+    int32_t runFor(void *object) {
+        const uint64_t round = nextRound();
+        int32_t called = 0;
+        for (Sweep sweep; takeOf(object, round, sweep); ++called)
             sweep.procedure(sweep.argument);
         return called;
     }
 
 private:
+    typedef std::unordered_multimap<void *, uint64_t> Numbers;
+
     class Hold {
     public:
         explicit Hold(qx::platform::Mutex &lock) : lock_(lock) { lock_.lock(); }
@@ -63,19 +74,22 @@ private:
         qx::platform::Mutex &lock_;
     };
 
-    // The link that points at the first such sweep, or the one at the end.
-    template <class Condition>
-    Sweep **find(Condition condition) {
-        Sweep **link = &first_;
-        while (*link != nullptr && !condition(**link))
-            link = &(*link)->next;
-        return link;
+    int32_t add(const Sweep &sweep) {
+        const uint64_t number = latest_ + 1;
+        try {
+            sweeps_.emplace(number, sweep);
+            ofArgument_.emplace(sweep.argument, number);
+        } catch (const std::bad_alloc &) {
+            sweeps_.erase(number);
+            return QXHostNoMemory;
+        }
+        latest_ = number;
+        return QXHostDone;
     }
 
-    static void remove(Sweep **link) {
-        Sweep *sweep = *link;
-        *link = sweep->next;
-        delete sweep;
+    void remove(Numbers::iterator entry) {
+        sweeps_.erase(entry->second);
+        ofArgument_.erase(entry);
     }
 
     uint64_t nextRound() {
@@ -83,22 +97,44 @@ private:
         return ++round_;
     }
 
-    template <class Condition>
-    bool take(uint64_t round, Condition applies, Sweep &sweep) {
+    // The first from `number` on that this run has not called; `number` moves behind it.
+    bool takeFrom(uint64_t &number, uint64_t round, Sweep &taken) {
         const Hold hold(lock_);
-        Sweep **link =
-            find([&](const Sweep &found) { return found.round < round && applies(found); });
-        if (*link == nullptr)
-            return false;
-        (*link)->round = round;
-        sweep = **link;
-        if (sweep.mode == ForObject)
-            remove(link);
-        return true;
+        for (auto at = sweeps_.lower_bound(number); at != sweeps_.end(); ++at) {
+            if (at->second.round >= round)
+                continue;
+            number = at->first + 1;
+            at->second.round = round;
+            taken = at->second;
+            if (taken.mode == ForObject) {
+                auto entry = ofArgument_.equal_range(taken.argument).first;
+                while (entry->second != at->first)
+                    ++entry;
+                remove(entry);
+            }
+            return true;
+        }
+        return false;
+    }
+
+    bool takeOf(void *object, uint64_t round, Sweep &taken) {
+        const Hold hold(lock_);
+        const auto [first, end] = ofArgument_.equal_range(object);
+        for (auto entry = first; entry != end; ++entry) {
+            const Sweep &sweep = sweeps_.at(entry->second);
+            if (sweep.mode != ForObject || sweep.round >= round)
+                continue;
+            taken = sweep;
+            remove(entry);
+            return true;
+        }
+        return false;
     }
 
     qx::platform::Mutex lock_;
-    Sweep *first_ = nullptr;
+    std::map<uint64_t, Sweep> sweeps_;
+    Numbers ofArgument_;
+    uint64_t latest_ = 0;
     uint64_t round_ = 0;
 };
 
@@ -116,11 +152,6 @@ int32_t HostRegisterSweep(QXHostSweep procedure, void *argument, int32_t mode) {
     return Sweeps().change(procedure, argument, mode);
 }
 
-int32_t QXHostRunSweeps() {
-    return Sweeps().run([](const Sweep &) { return true; });
-}
+int32_t QXHostRunSweeps() { return Sweeps().runAll(); }
 
-int32_t QXHostReleaseObject(void *object) {
-    return Sweeps().run(
-        [=](const Sweep &sweep) { return sweep.mode == ForObject && sweep.argument == object; });
-}
+int32_t QXHostReleaseObject(void *object) { return Sweeps().runFor(object); }

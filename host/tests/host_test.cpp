@@ -4,6 +4,7 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <atomic>
 #include <cstring>
 #include <thread>
@@ -175,6 +176,36 @@ TEST(Sweeps, RunOncePerRunAndObjectsAreForgotten) {
     EXPECT_EQ(QXHostReleaseObject(&object), 0);
     HostRegisterSweep(Count, &process, 0);
     EXPECT_EQ(QXHostRunSweeps(), 0);
+}
+
+std::vector<std::ptrdiff_t> sweptOrder;
+const char *firstSwept = nullptr;
+int32_t NoteOrder(void *argument) {
+    sweptOrder.push_back(static_cast<const char *>(argument) - firstSwept);
+    return 0;
+}
+
+// As many as a large program has slots; the order stays, whatever is withdrawn between.
+TEST(Sweeps, OfManyObjectsAreCalledInTheirOrder) {
+    constexpr std::ptrdiff_t count = 80000;
+    const std::vector<char> objects(count);
+    firstSwept = objects.data();
+    const auto object = [&](std::ptrdiff_t i) {
+        return const_cast<char *>(&objects[static_cast<std::size_t>(i)]);
+    };
+    sweptOrder.clear();
+    for (std::ptrdiff_t i = 0; i < count; ++i)
+        ASSERT_EQ(HostRegisterSweep(NoteOrder, object(i), 2), 0);
+    for (std::ptrdiff_t i = 0; i < count; i += 4)
+        ASSERT_EQ(HostRegisterSweep(NoteOrder, object(i), 0), 0);
+    for (std::ptrdiff_t i = count - 1; i > 0; i -= 4) // 79999, 79995 ...
+        ASSERT_EQ(QXHostReleaseObject(object(i)), 1);
+    EXPECT_EQ(sweptOrder.size(), static_cast<std::size_t>(count / 4));
+    EXPECT_EQ(sweptOrder.front(), count - 1);
+    sweptOrder.clear();
+    EXPECT_EQ(QXHostRunSweeps(), count / 2);
+    EXPECT_TRUE(std::is_sorted(sweptOrder.begin(), sweptOrder.end()));
+    EXPECT_EQ(QXHostReleaseObject(object(1)), 0);
 }
 
 TEST(Sweeps, FromManyThreadsAllArrive) {

@@ -12,18 +12,18 @@
 #include <cstdlib>
 #include <limits>
 #include <mutex>
+#include <new>
 
 namespace qx {
 namespace {
 
 using std::ptrdiff_t;
 
-// The cache: every plan that has a holder, the newest first.
-platform::Mutex cacheMutex;
+// The cache: every plan that has a holder, the newest first. The mutex lives as long as the
+// process and has no destructor: the host may sweep plans from its last exit handler.
+alignas(platform::Mutex) unsigned char cacheMutexMemory[sizeof(platform::Mutex)];
+platform::Mutex &cacheMutex = *new (cacheMutexMemory) platform::Mutex;
 FFTPlan *cacheHead = nullptr;
-
-FFTPlan *Acquire(int32_t length);
-void Release(FFTPlan *plan);
 
 // A table from the heap, for a plan outlives the workspace. Sizes that int32 cannot count are
 // refused on every target alike; an empty table takes no memory and stays null.
@@ -110,13 +110,34 @@ bool BuildRoots(FFTStage *stage, int32_t p) {
     return true;
 }
 
-// The smallest g whose powers reach 1 modulo the prime p only after p - 1 steps.
+int32_t PowerModulo(int32_t base, int32_t exponent, int32_t p) {
+    int64_t result = 1;
+    for (int64_t square = base; exponent > 0; exponent >>= 1, square = square * square % p)
+        if (exponent & 1)
+            result = result * square % p;
+    return static_cast<int32_t>(result);
+}
+
+// The smallest g whose powers reach 1 modulo the prime p only after p - 1 steps: no power to
+// (p - 1) / q with a prime q is 1.
 int32_t Generator(int32_t p) {
+    int32_t primes[9]; // the product of the first ten passes int32
+    int32_t count = 0;
+    int32_t rest = p - 1;
+    for (int32_t q = 2; int64_t{q} * q <= rest; ++q) {
+        if (rest % q != 0)
+            continue;
+        primes[count++] = q;
+        while (rest % q == 0)
+            rest /= q;
+    }
+    if (rest > 1)
+        primes[count++] = rest;
     for (int32_t g = 2;; ++g) {
-        int32_t order = 1;
-        for (int64_t power = g; power != 1; power = power * g % p)
-            ++order;
-        if (order == p - 1)
+        int32_t i = 0;
+        while (i < count && PowerModulo(g, (p - 1) / primes[i], p) != 1)
+            ++i;
+        if (i == count)
             return g;
     }
 }
@@ -165,7 +186,7 @@ bool BuildRader(FFTStage *stage, int32_t p) {
     if (!Allocate(stage->raderCos, n) || !Allocate(stage->raderSin, n) ||
         !Allocate(stage->raderGather, p) || !Allocate(stage->raderScatter, p))
         return false;
-    stage->raderPlan = Acquire(n);
+    stage->raderPlan = qx::create_oxfft_table(n);
     if (stage->raderPlan == nullptr)
         return false;
     BuildRaderOrders(stage, p);
@@ -220,61 +241,93 @@ void Dismantle(FFTPlan *plan) {
             std::free(table);
         std::free(stage->raderGather);
         std::free(stage->raderScatter);
-        Release(stage->raderPlan);
+        qx::destroy_oxfft_table(stage->raderPlan);
         std::free(stage);
     }
     std::free(const_cast<double *>(plan->quarterWave.load(std::memory_order_relaxed)));
     std::free(plan);
 }
 
-// The rest runs under the mutex.
-
-FFTPlan *Acquire(int32_t length) {
-    if (length < 1)
-        return nullptr;
-    for (FFTPlan *plan = cacheHead; plan != nullptr; plan = plan->next) {
-        if (plan->length == length) {
-            ++plan->refCount;
-            return plan;
-        }
-    }
+FFTPlan *Build(int32_t length) {
     auto *const plan = static_cast<FFTPlan *>(std::calloc(1, sizeof(FFTPlan)));
     if (plan == nullptr)
         return nullptr;
     plan->length = length;
     Factorise(plan);
     FillKernels(plan);
-    if (!BuildStages(plan)) {
-        Dismantle(plan);
-        return nullptr;
+    if (BuildStages(plan))
+        return plan;
+    Dismantle(plan);
+    return nullptr;
+}
+
+// The next three run under the mutex.
+
+FFTPlan *Find(int32_t length) {
+    for (FFTPlan *plan = cacheHead; plan != nullptr; plan = plan->next) {
+        if (plan->length == length) {
+            ++plan->refCount;
+            return plan;
+        }
     }
+    return nullptr;
+}
+
+void Insert(FFTPlan *plan) {
     plan->refCount = 1;
     plan->next = cacheHead;
     if (cacheHead != nullptr)
         cacheHead->prev = plan;
     cacheHead = plan;
-    return plan;
 }
 
-void Release(FFTPlan *plan) {
-    if (plan == nullptr || --plan->refCount > 0)
-        return;
+// Whether that was the last holder, and the plan is out of the cache.
+bool LeaveCache(FFTPlan *plan) {
+    if (--plan->refCount > 0)
+        return false;
     (plan->prev != nullptr ? plan->prev->next : cacheHead) = plan->next;
     if (plan->next != nullptr)
         plan->next->prev = plan->prev;
-    Dismantle(plan);
+    return true;
 }
 
 } // namespace
 
+// A plan is built and dismantled outside the mutex, so that nobody waits for a long one. Of two
+// threads that build the same length at once one keeps its plan and the other takes that.
 FFTPlan *create_oxfft_table(int32_t length) {
-    const std::lock_guard<platform::Mutex> lock(cacheMutex);
-    return Acquire(length);
+    if (length < 1)
+        return nullptr;
+    {
+        const std::lock_guard<platform::Mutex> lock(cacheMutex);
+        if (FFTPlan *const found = Find(length))
+            return found;
+    }
+    FFTPlan *const built = Build(length);
+    if (built == nullptr)
+        return nullptr;
+    FFTPlan *found;
+    {
+        const std::lock_guard<platform::Mutex> lock(cacheMutex);
+        found = Find(length);
+        if (found == nullptr) {
+            Insert(built);
+            return built;
+        }
+    }
+    Dismantle(built);
+    return found;
 }
 
 void destroy_oxfft_table(FFTPlan *plan) {
-    const std::lock_guard<platform::Mutex> lock(cacheMutex);
-    Release(plan);
+    if (plan == nullptr)
+        return;
+    {
+        const std::lock_guard<platform::Mutex> lock(cacheMutex);
+        if (!LeaveCache(plan))
+            return;
+    }
+    Dismantle(plan);
 }
 
 } // namespace qx

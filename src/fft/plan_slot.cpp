@@ -31,11 +31,14 @@ ErrorCode Acquire(PlanSlot *slot, int32_t n) {
     const bool isNew = !cell->plan;
     qx::destroy_oxfft_table(cell->plan);
     cell->plan = qx::create_oxfft_table(n);
-    if (cell->plan) {
-        if (Swept && isNew)
-            HostRegisterSweep(CellSweep, cell, SweepForObject);
-        return 0;
+    // A plan that nobody would sweep is none.
+    if (cell->plan && Swept && isNew &&
+        HostRegisterSweep(CellSweep, cell, SweepForObject) != 0) {
+        qx::destroy_oxfft_table(cell->plan);
+        cell->plan = nullptr;
     }
+    if (cell->plan)
+        return 0;
     if (Swept && !isNew)
         HostRegisterSweep(CellSweep, cell, SweepWithdraw);
     std::free(cell);
@@ -62,7 +65,7 @@ ErrorCode TransformInstanceReserve(InstanceWord *word) {
 }
 
 void TransformInstanceRelease(InstanceWord *word) {
-    if (!*word)
+    if (!word || !*word)
         return;
     auto *const instance = static_cast<TransformInstance *>(*word);
     ReleaseSlot(&instance->first);

@@ -130,19 +130,30 @@ ErrorCode AnalysisWorkspace::allocate(int64_t size, void **payload) {
 
     const uint64_t total = static_cast<uint64_t>(size) + blockOverhead;
     const uintptr_t thread = platform::CurrentThread();
-    const State now = unpack(state_.load(std::memory_order_acquire));
-    if (now.live == noRegion)
-        return ErrWorkspaceNotInitialized;
+    // Room that another thread was moving while this one looked is looked for again, a few times.
+    for (int look = 0; look < 8; ++look) {
+        const uint64_t seen = state_.load(std::memory_order_acquire);
+        const uint64_t seenUnits = usedUnits_.load(std::memory_order_acquire);
+        if (unpack(seen).live == noRegion)
+            return ErrWorkspaceNotInitialized;
+        if (tryAllocate(unpack(seen), total, thread, payload))
+            return 0;
+        if (state_.load(std::memory_order_acquire) == seen &&
+            usedUnits_.load(std::memory_order_acquire) == seenUnits)
+            break;
+    }
+    markFull(total);
+    return ErrWorkspaceExhausted;
+}
+
+bool AnalysisWorkspace::tryAllocate(State now, uint64_t total, uintptr_t thread, void **payload) {
     const bool isOurs = now.live == 0 || stackOwner_.load(std::memory_order_relaxed) == thread;
     // A stack that has grown long beside used units is left to run empty.
     const bool isLong = now.isShared && now.bump > limit_.load(std::memory_order_relaxed) / 4;
     const bool stackFirst = isOurs && !isLong;
-    if ((stackFirst && allocateInStack(total, thread, payload)) ||
-        allocateInUnits(total, thread, payload) ||
-        (!stackFirst && allocateInStack(total, thread, payload)))
-        return 0;
-    markFull(total);
-    return ErrWorkspaceExhausted;
+    return (stackFirst && allocateInStack(total, thread, payload)) ||
+           allocateInUnits(total, thread, payload) ||
+           (!stackFirst && allocateInStack(total, thread, payload));
 }
 
 void *AnalysisWorkspace::place(uint32_t chunk, uint32_t start, uint32_t end) {
@@ -348,7 +359,8 @@ bool AnalysisWorkspace::takeUnits(uint32_t count, uint32_t unit, uint32_t *first
                                              std::memory_order_acq_rel, std::memory_order_acquire))
             return true;
 
-    raiseCeiling();
+    while (count > 1 && raiseCeiling())
+        continue;
     uint64_t seen = state_.load(std::memory_order_acquire);
     State next;
     do {
@@ -370,28 +382,24 @@ void AnalysisWorkspace::releaseUnits(uint32_t first, uint32_t count) {
     usedUnits_.fetch_and(~MaskOf(first, count), std::memory_order_acq_rel);
 }
 
-// Gives the stack the free units at its end; whether there were any.
+// Gives the stack the unit at its end if that is free. One at a time: what a thread holds on the
+// way nobody else can have.
 bool AnalysisWorkspace::raiseCeiling() {
     const uint32_t from = unpack(state_.load(std::memory_order_acquire)).ceiling;
     if (from == units)
         return false;
-    uint64_t used = usedUnits_.load(std::memory_order_acquire);
-    uint32_t count;
-    do {
-        count = std::min(static_cast<uint32_t>(std::countr_zero(used >> from)), units - from);
-        if (count == 0)
-            return false;
-    } while (!usedUnits_.compare_exchange_weak(
-        used, used | MaskOf(from, count), std::memory_order_acq_rel, std::memory_order_acquire));
+    const uint64_t unit = MaskOf(from, 1);
+    if ((usedUnits_.fetch_or(unit, std::memory_order_acq_rel) & unit) != 0)
+        return false;
     uint64_t seen = state_.load(std::memory_order_acquire);
     State next;
     do {
         next = unpack(seen);
-        if (next.ceiling != from) { // lowered meanwhile, or raised by another
-            releaseUnits(from, count);
+        if (next.ceiling != from) { // lowered meanwhile
+            releaseUnits(from, 1);
             return false;
         }
-        next.ceiling += count;
+        ++next.ceiling;
     } while (!state_.compare_exchange_weak(seen, pack(next), std::memory_order_acq_rel,
                                            std::memory_order_acquire));
     return true;

@@ -88,6 +88,7 @@ private:
     enum class Phase { None, Changing, Ready };
 
     ErrorCode checkOwner() const;
+    bool tryAllocate(State now, uint64_t total, uintptr_t thread, void **payload);
     bool fitsStack(uint64_t end, uint32_t ceiling) const;
     bool push(uint64_t total, State *before);
     bool allocateInStack(uint64_t total, uintptr_t thread, void **payload);

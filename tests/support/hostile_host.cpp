@@ -206,6 +206,8 @@ int32_t ReshapeBlock(int32_t typeCode, int32_t numDims, void *handleAddress, int
 
 int32_t RegisterSweep(SweepProcedure procedure, void *argument, int32_t mode) {
     const HeapProbe::Pause pause;
+    if (mode != SweepWithdraw && Host().sweepStatus != 0)
+        return Host().sweepStatus;
     const std::lock_guard hold(Blocks().lock);
     if (mode == SweepWithdraw)
         Blocks().sweeps.erase({procedure, argument});

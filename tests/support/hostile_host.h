@@ -29,6 +29,7 @@ struct HostRecord {
     std::vector<Reshape> reshapes; // in order, refused ones included
     int32_t failAt = 0;            // the n-th reshape from the last reset fails; 0 for none
     int32_t failStatus = 0;        // with this status
+    int32_t sweepStatus = 0;       // what a registration of a sweep gives; not 0 refuses it
 };
 HostRecord &Host();
 constexpr int32_t everyReshape = -1; // as `failAt`

@@ -1,11 +1,16 @@
 #include "fft/plan.h"
+#include "fft/plan_slot.h"
 #include "tests/support/heap_probe.h"
+#include "tests/support/hostile_host.h"
 
 #include <gtest/gtest.h>
 
+#include <atomic>
 #include <cmath>
 #include <cstdint>
 #include <limits>
+#include <set>
+#include <thread>
 #include <utility>
 #include <vector>
 
@@ -140,6 +145,58 @@ TEST(Plan, HoldsTheRootsAtTheirPlaces) {
 }
 
 // Each allocation of a plan with three sub-plans fails in turn: nothing stays behind.
+// Threads that take and give back the same lengths at once, primes with plans inside plans among
+// them, end up with one plan per length and none in the end.
+TEST(Plan, IsSharedByThreadsThatBuildItAtOnce) {
+    constexpr int32_t lengths[] = {53, 106, 5003, 4096, 2809};
+    std::atomic<int> faults = 0;
+    std::vector<std::thread> threads;
+    for (int t = 0; t < 8; ++t)
+        threads.emplace_back([&, t] {
+            for (int round = 0; round < 200; ++round) {
+                const int32_t length = lengths[(round + t) % 5];
+                FFTPlan *const plan = qx::create_oxfft_table(length);
+                FFTPlan *const again = qx::create_oxfft_table(length);
+                faults += plan == nullptr || plan != again || plan->length != length;
+                qx::destroy_oxfft_table(again);
+                qx::destroy_oxfft_table(plan);
+            }
+        });
+    for (std::thread &thread : threads)
+        thread.join();
+    EXPECT_EQ(faults, 0);
+    for (const int32_t length : lengths) {
+        const PlanReference plan(length);
+        EXPECT_EQ(plan.get()->refCount, 1) << length;
+    }
+}
+
+// The orders of a prime hold the powers of its smallest generator: all residues, once each.
+TEST(Plan, OrdersOfPrimesAreThePowersOfAGenerator) {
+    for (const auto &[p, generator] :
+         {std::pair{53, 2}, {71, 7}, {191, 19}, {409, 21}, {5881, 31}}) {
+        const PlanReference plan(p);
+        const int32_t *order = plan.get()->stages[0]->raderScatter;
+        EXPECT_EQ(order[2], generator) << p;
+        EXPECT_EQ((std::set<int32_t>(order + 1, order + p).size()),
+                  static_cast<std::size_t>(p - 1));
+    }
+}
+
+TEST(PlanSlot, IsRefusedWhereNobodyWouldSweepIt) {
+    PlanSlot slot = nullptr;
+    qx::test::Host().sweepStatus = 5;
+    EXPECT_EQ(qx::PlanSlotAcquire(&slot, 12), ErrOutOfMemory);
+    EXPECT_EQ(slot, nullptr);
+    qx::test::ResetHost();
+    {
+        const PlanReference plan(12);
+        EXPECT_EQ(plan.get()->refCount, 1) << "the refused plan was given back";
+    }
+    ASSERT_EQ(qx::PlanSlotAcquire(&slot, 12), 0);
+    qx::test::RunSweepOf(slot);
+}
+
 TEST(Plan, IsBuiltWholeOrNotAtAll) {
     if (!qx::test::HeapProbe::works())
         GTEST_SKIP();
