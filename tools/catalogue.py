@@ -32,6 +32,7 @@ NOT_A_FAMILY = {"types.h", "errors.h", "host.h", "qx.h"}
 # C type of a scalar -> element name.
 SCALARS = {
     "int32_t": "I32", "I32": "I32", "ErrorCode": "I32", "uint8_t": "U8", "U8": "U8",
+    "int16_t": "I16",
     "uint32_t": "U32", "U32": "U32", "float": "SGL", "SGL": "SGL", "double": "DBL", "DBL": "DBL",
     "CSG": "CSG", "CDB": "CDB",
 }

@@ -177,8 +177,7 @@ int32_t ReshapeBlock(int32_t typeCode, int32_t numDims, void *handleAddress, int
     const HeapProbe::Pause pause;
     HostRecord &record = Host();
     record.reshapes.push_back({typeCode, numDims, count});
-    if (record.failAt == everyReshape ||
-        (record.failAt != 0 && static_cast<int32_t>(record.reshapes.size()) == record.failAt))
+    if (record.failAt != 0 && static_cast<int32_t>(record.reshapes.size()) == record.failAt)
         return record.failStatus;
 
     const std::lock_guard hold(Blocks().lock);

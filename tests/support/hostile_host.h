@@ -32,7 +32,6 @@ struct HostRecord {
     int32_t sweepStatus = 0;       // what a registration of a sweep gives; not 0 refuses it
 };
 HostRecord &Host();
-constexpr int32_t everyReshape = -1; // as `failAt`
 // Forgets the calling thread's record and sets which reshape fails.
 void ResetHost(int32_t failAt = 0, int32_t failStatus = 0);
 

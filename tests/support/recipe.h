@@ -136,7 +136,10 @@ public:
     }
 
     // An input that may be empty without a failure (quirk TakesEmptyInput: all of them).
-    void mayBeEmpty(int number) { mayBeEmpty_.push_back(number); }
+    void mayBeEmpty(int number) {
+        const HeapProbe::Pause pause;
+        mayBeEmpty_.push_back(number);
+    }
 
     // Scalar outputs: a failure leaves the quiet NaN, in both parts of a complex one, or for
     // integers 0.

@@ -1,0 +1,1 @@
+qx_bench(multirate SOURCES multirate.cpp PEERS liquid samplerate)

@@ -1,0 +1,49 @@
+#ifndef QX_POLYPHASE_H
+#define QX_POLYPHASE_H
+
+/* FIR filtering of a stream in blocks with change of the rate, by polyphase terms only.
+
+   The caller keeps `state`, `delayLeft` and `phase` and hands them back unchanged with each block;
+   blocks may have any size, and give to the bit what one block would give. A stream begins with a
+   reset, as does every change of h, L or M. A failure empties y and state and clears delayLeft and
+   phase. */
+
+#include "qx/types.h"
+
+QX_BEGIN_DECLS
+
+/** Filters a block at one of four rates, with n taps h and upsampled position t of the outputs:
+    mode 0 the same rate, y[t] = gain sum over k of h[k] x[t - k]; mode 1 L times the rate,
+    y[t] = gain L sum over j of h[t mod L + j L] x[t / L - j]; mode 2 every M-th output of mode 0
+    without the gain; mode 3 every M-th output of mode 1. *reset, or an empty state, begins a
+   stream; with *removeDelay its group delay of (n - 1) / 2 samples is taken off, else outputs begin
+   with the first input. The size of state is n - 1, ceil(n / L), ceil(n / M) + 1 or ceil(n / L) by
+    mode. A change of h or of the rates is noticed by that size alone.
+    Codes: ErrOrderNotPositive (h is empty), ErrNotStrictlyPositive (L or M below 1),
+    ErrInvalidSelector (no such mode), ErrNegativeSetting (delayLeft is negative), ErrBadTapCount
+    (the delay is to be removed from an even number of taps), ErrStateSizeMismatch (state has
+    another size and no reset is in force), ErrOutOfMemory (no memory), WarnEmptyResult (x is
+    empty). */
+QX_API ErrorCode ppMultiRateFIRH_DBL(QX_IN DBL1D x, QX_OUT DBL1D y, QX_INOUT DBL1D state,
+                                     int32_t mode, int32_t L, int32_t M, QX_IN DBL1D h, double gain,
+                                     QX_IN const uint8_t *reset, QX_IN const uint8_t *removeDelay,
+                                     QX_INOUT int32_t *delayLeft, QX_INOUT int32_t *phase);
+/** As ppMultiRateFIRH_DBL, in single precision throughout. */
+QX_API ErrorCode ppMultiRateFIRH_SGL(QX_IN SGL1D x, QX_OUT SGL1D y, QX_INOUT SGL1D state,
+                                     int32_t mode, int32_t L, int32_t M, QX_IN SGL1D h, float gain,
+                                     QX_IN const uint8_t *reset, QX_IN const uint8_t *removeDelay,
+                                     QX_INOUT int32_t *delayLeft, QX_INOUT int32_t *phase);
+/** As ppMultiRateFIRH_DBL, for complex data and real taps. */
+QX_API ErrorCode ppMultiRateFIRH_CDB(QX_IN CDB1D x, QX_OUT CDB1D y, QX_INOUT CDB1D state,
+                                     int32_t mode, int32_t L, int32_t M, QX_IN DBL1D h, double gain,
+                                     QX_IN const uint8_t *reset, QX_IN const uint8_t *removeDelay,
+                                     QX_INOUT int32_t *delayLeft, QX_INOUT int32_t *phase);
+/** As ppMultiRateFIRH_DBL, for complex data and real taps, in single precision throughout. */
+QX_API ErrorCode ppMultiRateFIRH_CSG(QX_IN CSG1D x, QX_OUT CSG1D y, QX_INOUT CSG1D state,
+                                     int32_t mode, int32_t L, int32_t M, QX_IN SGL1D h, float gain,
+                                     QX_IN const uint8_t *reset, QX_IN const uint8_t *removeDelay,
+                                     QX_INOUT int32_t *delayLeft, QX_INOUT int32_t *phase);
+
+QX_END_DECLS
+
+#endif

@@ -1,0 +1,203 @@
+#ifndef QX_MULTIRATE_FILTERED_SUMS_H
+#define QX_MULTIRATE_FILTERED_SUMS_H
+
+#include "frame/scratch.h"
+#include "multirate/samples.h"
+#include "multirate/tap_sums.h"
+
+#include <algorithm>
+#include <cstdint>
+
+namespace qx {
+
+// The outputs of a filter at changed rate, computed at kept positions only.
+
+// Which taps meet which samples in one output: terms j = 0, 1, ... of tap + j tapStep and
+// sample + j sampleStep, added to 0 in this order.
+struct OutputSum {
+    int64_t sample;
+    int32_t tap;
+    int32_t terms;
+
+    int64_t lowestSample(int32_t step) const {
+        return step < 0 ? sample + int64_t{terms - 1} * step : sample;
+    }
+    int64_t highestSample(int32_t step) const {
+        return step < 0 ? sample : sample + int64_t{terms - 1} * step;
+    }
+};
+
+// Output m + period takes the taps of output m, `advance` samples further on.
+struct Rhythm {
+    int32_t period;
+    int32_t advance;
+    int32_t tapStep;
+    int32_t sampleStep;
+};
+
+// One output by itself.
+template <ElementType Code>
+void FilteredSum(const Samples<Code> &samples, const RealOf<Code> *h, const Rhythm &rhythm,
+                 OutputSum output, RealOf<Code> scale, typename Element<Code>::type *y) {
+    constexpr int parts = SampleParts<Code>::count;
+    RealOf<Code> sum[parts] = {};
+    const RealOf<Code> *tap = h + output.tap;
+    int64_t at = output.sample;
+    for (int32_t j = 0; j < output.terms; ++j, tap += rhythm.tapStep, at += rhythm.sampleStep) {
+        const RealOf<Code> *sample = Reals<Code>(samples.at(at));
+        for (int part = 0; part < parts; ++part)
+            sum[part] = sum[part] + *tap * sample[part];
+    }
+    for (int part = 0; part < parts; ++part)
+        Reals<Code>(y)[part] = scale * sum[part];
+}
+
+// Whole periods of outputs side by side: output r of every period is one row of neighbouring sums,
+// once the samples stand in rows of every advance-th one. Order and bits of each sum are those of
+// FilteredSum.
+template <ElementType Code>
+class PeriodRows {
+    typedef typename Element<Code>::type T;
+    typedef RealOf<Code> Real;
+    typedef TapRow<SampleParts<Code>::real> Row;
+    static constexpr int parts = SampleParts<Code>::count;
+    static constexpr int32_t rowsAtOnce = 4;
+
+public:
+    PeriodRows(const Samples<Code> &samples, const Real *h, const Rhythm &rhythm, Real scale)
+        : samples_(samples), h_(h), rhythm_(rhythm), scale_(scale) {}
+
+    // y holds the outputs from `first` on; sumOf(m) tells output m.
+    template <class SumOf>
+    ErrorCode run(const SumOf &sumOf, int32_t first, int32_t periods, T *y) {
+        findSpan(sumOf, first);
+        if (const ErrorCode failed = prepare(periods))
+            return failed;
+        for (int32_t done = 0; done < periods; done += chunk_) {
+            const int32_t now = std::min(chunk_, periods - done);
+            fillRows(lowest_ + int64_t{done} * rhythm_.advance, now);
+            T *to = y + int64_t{done} * rhythm_.period;
+            if (rhythm_.period == 1)
+                sumOneRow(sumOf(first), now, to);
+            else
+                for (int32_t r = 0; r < rhythm_.period; r += rowsAtOnce)
+                    sumRows(sumOf, first + r, std::min(rowsAtOnce, rhythm_.period - r), now,
+                            to + r);
+        }
+        return 0;
+    }
+
+private:
+    // The samples that the first period meets.
+    template <class SumOf>
+    void findSpan(const SumOf &sumOf, int32_t first) {
+        int64_t highest = -1;
+        for (int32_t r = 0; r < rhythm_.period; ++r) {
+            const OutputSum output = sumOf(first + r);
+            if (output.terms < 1)
+                continue;
+            const int64_t lowest = output.lowestSample(rhythm_.sampleStep);
+            lowest_ = highest < 0 ? lowest : std::min(lowest_, lowest);
+            highest = std::max(highest, output.highestSample(rhythm_.sampleStep));
+        }
+        span_ = std::max<int64_t>(highest - lowest_ + 1, 1);
+    }
+
+    ErrorCode prepare(int32_t periods) {
+        // A chunk's samples stay in the cache, and its rows are long enough for the widest lanes.
+        constexpr int32_t samplesAtOnce = 4096, shortestRow = 64;
+        rows_ = static_cast<int32_t>(std::min<int64_t>(rhythm_.advance, span_));
+        chunk_ = std::min(periods, std::max(shortestRow, samplesAtOnce / rows_));
+        pitch_ = (span_ + rhythm_.advance - 1) / rhythm_.advance + paddedWidth(chunk_) / parts;
+        const int32_t sums = rhythm_.period == 1 ? 0 : rowsAtOnce * paddedWidth(chunk_);
+        if (const ErrorCode failed = rowsMemory_.allocate(parts * rows_ * pitch_))
+            return failed;
+        if (const ErrorCode failed = sums_.allocate(sums))
+            return failed;
+        if (const ErrorCode failed = offsets_.allocate(span_))
+            return failed;
+        ClearSamples<SampleParts<Code>::real>(rowsMemory_.data(), parts * rows_ * pitch_);
+        for (int64_t i = 0; i < span_; ++i)
+            offsets_[i] =
+                static_cast<int32_t>(parts * (i % rhythm_.advance * pitch_ + i / rhythm_.advance));
+        return 0;
+    }
+
+    // The reals of a row of sums, made up to whole vectors of the widest lanes: what is computed
+    // behind its end goes nowhere.
+    static int32_t paddedWidth(int32_t periods) {
+        constexpr int32_t vector = 32 / sizeof(Real);
+        return (parts * periods + vector - 1) / vector * vector;
+    }
+
+    // Row r holds the samples base + r, base + r + advance, ... as far as `periods` periods reach.
+    void fillRows(int64_t base, int32_t periods) {
+        const int64_t used = span_ + int64_t{periods - 1} * rhythm_.advance;
+        for (int32_t r = 0; r < rows_; ++r)
+            samples_.gather(base + r, rhythm_.advance, (used - r - 1) / rhythm_.advance + 1,
+                            reinterpret_cast<T *>(rowsMemory_.data()) + r * pitch_);
+    }
+
+    Row rowOf(const OutputSum &output, Real *sums) const {
+        return {h_ + output.tap, offsets_.data() + (output.terms > 0 ? output.sample - lowest_ : 0),
+                output.terms, sums};
+    }
+    void sum(const Row *rows, int32_t count, int32_t width) const {
+        if constexpr (SampleParts<Code>::real == ElementType::DBL)
+            TapSumsDBL(rows, count, rhythm_.tapStep, rhythm_.sampleStep, rowsMemory_.data(), scale_,
+                       width);
+        else
+            TapSumsSGL(rows, count, rhythm_.tapStep, rhythm_.sampleStep, rowsMemory_.data(), scale_,
+                       width);
+    }
+
+    void sumOneRow(const OutputSum &output, int32_t periods, T *y) const {
+        const Row row = rowOf(output, Reals<Code>(y));
+        sum(&row, 1, parts * periods);
+    }
+    template <class SumOf>
+    void sumRows(const SumOf &sumOf, int32_t m, int32_t count, int32_t periods, T *y) const {
+        const int32_t width = paddedWidth(periods);
+        Row rows[rowsAtOnce];
+        for (int32_t r = 0; r < count; ++r)
+            rows[r] = rowOf(sumOf(m + r), sums_.data() + r * width);
+        sum(rows, count, width);
+        for (int32_t r = 0; r < count; ++r)
+            for (int32_t s = 0; s < periods; ++s)
+                y[int64_t{s} * rhythm_.period + r] = reinterpret_cast<const T *>(rows[r].sums)[s];
+    }
+
+    const Samples<Code> samples_;
+    const Real *const h_;
+    const Rhythm rhythm_;
+    const Real scale_;
+    int64_t lowest_ = 0, span_ = 0, pitch_ = 0;
+    int32_t rows_ = 0, chunk_ = 0;
+    Scratch<SampleParts<Code>::real> rowsMemory_, sums_;
+    Scratch<ElementType::I32> offsets_;
+};
+
+// Outputs `first` to `end` - 1 into y. Before `regular` they may lack terms that the rhythm
+// promises.
+template <ElementType Code, class SumOf>
+ErrorCode FilteredSums(const Samples<Code> &samples, const RealOf<Code> *h, const Rhythm &rhythm,
+                       const SumOf &sumOf, RealOf<Code> scale, int32_t first, int32_t regular,
+                       int32_t end, typename Element<Code>::type *y) {
+    int32_t m = first;
+    for (; m < std::min(regular, end); ++m)
+        FilteredSum<Code>(samples, h, rhythm, sumOf(m), scale, y + (m - first));
+    const int32_t periods = (end - m) / rhythm.period;
+    if (periods > 1) {
+        PeriodRows<Code> rows(samples, h, rhythm, scale);
+        if (const ErrorCode failed = rows.run(sumOf, m, periods, y + (m - first)))
+            return failed;
+        m += periods * rhythm.period;
+    }
+    for (; m < end; ++m)
+        FilteredSum<Code>(samples, h, rhythm, sumOf(m), scale, y + (m - first));
+    return 0;
+}
+
+} // namespace qx
+
+#endif

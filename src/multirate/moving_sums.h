@@ -1,0 +1,41 @@
+#ifndef QX_MULTIRATE_MOVING_SUMS_H
+#define QX_MULTIRATE_MOVING_SUMS_H
+
+#include "frame/elements.h"
+
+#include <cstdint>
+
+namespace qx {
+
+// Cascades of moving sums, each a running value v over the last `width` inputs of its stage.
+enum class MovingSum {
+    Plain,         // v + x[i] - x[i - width]
+    AlternateEven, // x[i] - v - x[i - width]: shifted by half the sampling rate, for an even width
+    AlternateOdd,  // x[i] - v + x[i - width]: the same for an odd width
+};
+
+// Where a cascade keeps its state. Stage k has a ring of its latest `width` inputs at
+// rings[k ringStep], the oldest at `position`, and its running value at sums[k sumStep].
+template <ElementType Code>
+struct MovingSumState {
+    typename Element<Code>::type *rings;
+    int64_t ringStep;
+    typename Element<Code>::type *sums;
+    int64_t sumStep;
+    int32_t stages;
+    int32_t width;
+    int32_t position; // in 0 to width - 1; moves on with the samples
+};
+
+// Replaces x by the output of the last stage. Each stage gives v * scale, while v itself stays a
+// plain sum. Instances for DBL and CDB.
+template <ElementType Code>
+void MovingSumStages(MovingSumState<Code> &state, MovingSum kind, double scale,
+                     typename Element<Code>::type *x, int32_t n);
+
+// Turns the rings so that the oldest input stands first.
+void StraightenRings(MovingSumState<ElementType::DBL> &state);
+
+} // namespace qx
+
+#endif
