@@ -10,6 +10,7 @@
 #include "qx/distributions.h"
 #include "qx/errors.h"
 #include "qx/fft.h"
+#include "qx/filtering.h"
 #include "qx/frame.h"
 #include "qx/polyphase.h"
 #include "qx/rational_resampling.h"
@@ -20,5 +21,6 @@
 #include "qx/transforms.h"
 #include "qx/types.h"
 #include "qx/windows.h"
+#include "qx/zero_phase.h"
 
 #endif

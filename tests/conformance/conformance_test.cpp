@@ -173,7 +173,7 @@ TEST_P(Conformance, AnInputOfAnotherSizeKeepsTheContract) {
     run(probe);
     for (const Call::Size &size : probe.inputSizes())
         for (const int32_t other :
-             {1, size.value / 2, size.value - 1, size.value + 1, size.value * 2}) {
+             {1, size.value / 2, std::max(0, size.value - 1), size.value + 1, size.value * 2}) {
             SCOPED_TRACE("input " + std::to_string(size.input) + ", dimension " +
                          std::to_string(size.dimension) + " of " + std::to_string(other));
             Call call(n), again(n);

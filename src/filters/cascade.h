@@ -1,0 +1,53 @@
+#ifndef QX_FILTERS_CASCADE_H
+#define QX_FILTERS_CASCADE_H
+
+#include "frame/elements.h"
+#include "frame/widths.h"
+#include "qx/errors.h"
+
+#include <cstdint>
+
+namespace qx {
+
+// Cascades of sections of order m, 2 or 4, in direct form II. Each section has m values in `a`
+// (behind a leading 1 that is not stored), m + 1 in `b`, and m values w of its memory in `state`,
+// the newest first:
+//
+//     w = v - a[0] state[0] - a[1] state[1] - ...        from left to right
+//     v = b[0] w + b[1] state[0] + ... + b[m] state[m-1]  on to the next section
+//
+// The memory takes flush(w), and the output of the last section is flushed, as spectra/recursion.h
+// tells.
+
+// The order of the sections of each form; 0 where there is no such form.
+constexpr int32_t SectionOrder(int32_t form) { return form == 0 ? 2 : form == 1 ? 4 : 0; }
+
+struct CascadeCoefficients {
+    const DBL *a;
+    int32_t aCount;
+    const DBL *b;
+    int32_t bCount;
+    int32_t form;
+};
+
+// ErrCoefficientSizes where the counts, that of the state included, do not fit the form.
+ErrorCode FilterIIRCascade(const CascadeCoefficients &filter, DBL *state, int32_t stateCount,
+                           DBL *x, int32_t n);
+ErrorCode FilterIIRCascade(const CascadeCoefficients &filter, CDB *state, int32_t stateCount,
+                           CDB *x, int32_t n);
+
+struct CascadeRun {
+    const DBL *a, *b;
+    DBL *state;
+    int32_t sections, order;
+    DBL *x;
+    int32_t n;
+};
+
+// All sections over all samples, in lanes: sections of a group work at once, each a few samples
+// behind the one before it, and every value is that of the plain order.
+QX_BY_WIDTH(void, RunCascadeInLanes, (const CascadeRun &run))
+
+} // namespace qx
+
+#endif

@@ -1,0 +1,127 @@
+#include "filters/direct_form.h"
+
+#include "frame/scratch.h"
+#include "spectra/recursion.h"
+#include "spectra/sliding_sums.h"
+
+#include <algorithm>
+#include <cstddef>
+#include <cstring>
+
+namespace qx {
+namespace {
+
+constexpr auto Real = ElementType::DBL;
+constexpr auto Complex = ElementType::CDB;
+
+template <class T>
+void Copy(const T *from, std::ptrdiff_t count, T *to) {
+    std::memcpy(static_cast<void *>(to), from, sizeof(T) * static_cast<std::size_t>(count));
+}
+
+// y[t] = sum over k of b[nb-1-k] x[t+k], the real and the imaginary parts apart where either the
+// taps or the signal are real.
+void Slide(ConstantSteps<Real> taps, int32_t nb, const DBL *x, int64_t length, DBL *y,
+           int32_t count) {
+    SlidingSums({taps, nb, {x}, length, 0, {y}, count});
+}
+void Slide(ConstantSteps<Real> taps, int32_t nb, const CDB *x, int64_t length, CDB *y,
+           int32_t count) {
+    SlidingSums({taps, nb, {&x->re, 2}, length, 0, {&y->re, 2}, count});
+    SlidingSums({taps, nb, {&x->im, 2}, length, 0, {&y->im, 2}, count});
+}
+void Slide(ConstantSteps<Complex> taps, int32_t nb, const CDB *x, int64_t length, CDB *y,
+           int32_t count) {
+    SlidingSums({taps, nb, {x}, length, 0, {y}, count});
+}
+void Slide(ConstantSteps<Complex> taps, int32_t nb, const DBL *x, int64_t length, CDB *y,
+           int32_t count) {
+    const std::ptrdiff_t step = 2 * taps.step;
+    SlidingSums({{&taps.at->re, step}, nb, {x}, length, 0, {&y->re, 2}, count});
+    SlidingSums({{&taps.at->im, step}, nb, {x}, length, 0, {&y->im, 2}, count});
+}
+
+double Product(double b, double x) { return b * x; }
+CDB Product(double b, const CDB &x) { return {b * x.re, b * x.im}; }
+CDB Product(const CDB &b, double x) { return {b.re * x, b.im * x}; }
+CDB Product(const CDB &b, const CDB &x) {
+    return {b.re * x.re - b.im * x.im, b.im * x.re + b.re * x.im};
+}
+double Sum(double a, double b) { return a + b; }
+CDB Sum(const CDB &a, const CDB &b) { return {a.re + b.re, a.im + b.im}; }
+
+// The sums over x of one sample, which needs no memory: a filter may be called for each sample.
+template <ElementType C, ElementType X>
+void OneSum(const typename DirectForm<C, X>::C *b, int32_t nb, typename DirectForm<C, X>::X x,
+            typename DirectForm<C, X>::X *state, typename DirectForm<C, X>::Y *y) {
+    const std::ptrdiff_t past = nb - 1;
+    typename DirectForm<C, X>::Y sum = {};
+    for (std::ptrdiff_t k = past; k > 0; --k)
+        sum = Sum(sum, Product(b[k], state[past - k]));
+    *y = Sum(sum, Product(b[0], x));
+    if (past > 0) {
+        std::memmove(static_cast<void *>(state), state + 1,
+                     sizeof x * static_cast<std::size_t>(past - 1));
+        state[past - 1] = x;
+    }
+}
+
+// The sums over x alone, from 0.0 on. Those that reach into the state run over a copy that joins
+// the state and the first samples; they come last, for the others read these samples in place.
+template <ElementType C, ElementType X>
+ErrorCode Sums(const typename DirectForm<C, X>::C *b, int32_t nb,
+               const typename DirectForm<C, X>::X *x, int32_t n,
+               typename DirectForm<C, X>::X *state, typename DirectForm<C, X>::Y *y) {
+    if (n == 1) {
+        OneSum<C, X>(b, nb, *x, state, y);
+        return 0;
+    }
+    const ConstantSteps<C> taps = {b + (nb - 1), -1};
+    const std::ptrdiff_t past = nb - 1;
+    const std::ptrdiff_t head = std::min<std::ptrdiff_t>(n, past);
+    Scratch<X> memory;
+    if (const ErrorCode failed = memory.allocate(2 * int64_t{past} + head))
+        return failed;
+    typename DirectForm<C, X>::X *const joined = memory.data();
+    typename DirectForm<C, X>::X *const newest = joined + (past + head);
+    Copy(state, past, joined);
+    Copy(x, head, joined + past);
+    Copy(n > past ? x + (n - past) : joined + n, past, newest);
+    if (n > past)
+        Slide(taps, nb, x, n, y + past, static_cast<int32_t>(n - past));
+    Slide(taps, nb, joined, past + head, y, static_cast<int32_t>(head));
+    Copy(newest, past, state);
+    return memory.release();
+}
+
+} // namespace
+
+template <ElementType Coefficient, ElementType Signal>
+ErrorCode DirectForm<Coefficient, Signal>::fir(const C *b, int32_t nb, const X *x, int32_t n,
+                                               X *state, Y *y) {
+    if (n < 1 || nb < 1)
+        return ErrEmptyInput;
+    if (nb > 1)
+        return Sums<Coefficient, Signal>(b, nb, x, n, state, y);
+    for (std::ptrdiff_t t = 0; t < n; ++t)
+        y[t] = Product(b[0], x[t]);
+    return 0;
+}
+
+template <ElementType Coefficient, ElementType Signal>
+ErrorCode DirectForm<Coefficient, Signal>::iir(const C *b, int32_t nb, X *xState, const C *a,
+                                               int32_t na, Y *yState, const X *x, int32_t n, Y *y) {
+    if (n < 1 || na < 1 || nb < 1)
+        return ErrEmptyInput;
+    if (const ErrorCode failed = Sums<Coefficient, Signal>(b, nb, x, n, xState, y))
+        return failed;
+    RunRecursion(a, na, yState, y, n);
+    return 0;
+}
+
+template struct DirectForm<ElementType::DBL, ElementType::DBL>;
+template struct DirectForm<ElementType::DBL, ElementType::CDB>;
+template struct DirectForm<ElementType::CDB, ElementType::CDB>;
+template struct DirectForm<ElementType::CDB, ElementType::DBL>;
+
+} // namespace qx

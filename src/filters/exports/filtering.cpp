@@ -1,0 +1,271 @@
+#include "filters/cascade.h"
+#include "filters/direct_form.h"
+
+#include "frame/export.h"
+#include "qx/filtering.h"
+
+#include <algorithm>
+#include <cstring>
+#include <limits>
+
+namespace qx {
+namespace {
+
+template <class Handle>
+using Kept = InOut<Handle, OnFailure::Keep>;
+
+// kept: the exports for arrays keep the state if their byte is 1, those for one sample clear it if
+// theirs is not 0.
+bool ClearsUnlessKept(const uint8_t *keepState) { return *keepState != 1; }
+bool ClearsIfReset(const uint8_t *reset) { return *reset != 0; }
+
+template <class View>
+Outcome EmptiedOnFailure(View &view, Outcome outcome) {
+    if (outcome.failed())
+        view.empty();
+    return outcome;
+}
+
+// Brings a state to its size. One of another size is worth nothing, and then neither is the other
+// one of the call. A refusal empties it.
+template <class View>
+Outcome Fit(View &state, int32_t size, bool &clears) {
+    if (state.size() == size)
+        return 0;
+    clears = true;
+    return EmptiedOnFailure(state, state.resize(size));
+}
+
+template <class View>
+void Clear(View &state) {
+    std::memset(static_cast<void *>(state.data()), 0,
+                sizeof *state.data() * static_cast<std::size_t>(state.size()));
+}
+
+// How many values a filter remembers for so many coefficients; none where there are none.
+int32_t Memory(int32_t coefficients) { return std::max(0, coefficients - 1); }
+
+// What the coefficients that are given ask for.
+enum class Path { Nothing, FIR, IIR, Missing };
+Path DirectPath(bool hasA, bool hasB) {
+    if (!hasB)
+        return hasA ? Path::Missing : Path::Nothing;
+    return hasA ? Path::IIR : Path::FIR;
+}
+Path CascadePath(bool hasA, bool hasB) {
+    if (hasA && hasB)
+        return Path::IIR;
+    return hasA || hasB ? Path::Missing : Path::Nothing;
+}
+
+template <class Coefficients, class X, class Y>
+ErrorCode RunDirect(Path path, const In<Coefficients> &a, const In<Coefficients> &b, X *xState,
+                    Y *yState, const X *x, int32_t n, Y *y) {
+    constexpr bool hasRealSignal = requires(const X *sample) { *sample + 1.0; };
+    typedef DirectForm<HandleTraits<Coefficients>::code,
+                       hasRealSignal ? ElementType::DBL : ElementType::CDB>
+        Filter;
+    if (path == Path::FIR)
+        return Filter::fir(b.data(), b.size(), x, n, xState, y);
+    return Filter::iir(b.data(), b.size(), xState, a.data(), a.size(), yState, x, n, y);
+}
+
+template <class XState, class YState>
+Outcome FitBoth(XState &xState, int32_t nb, YState &yState, int32_t na, bool clears) {
+    if (const Outcome bad = Fit(xState, Memory(nb), clears))
+        return bad;
+    if (const Outcome bad = Fit(yState, Memory(na), clears))
+        return bad;
+    if (clears) {
+        Clear(xState);
+        Clear(yState);
+    }
+    return 0;
+}
+
+// In place, with the states of x and y apart. What comes before the filtering leaves the states as
+// they are, a refused one excepted.
+template <class Signal, class Coefficients>
+Outcome FilterTwoStates(Kept<Signal> x, In<Coefficients> a, In<Coefficients> b, Kept<Signal> xState,
+                        Kept<Signal> yState, bool clears) {
+    if (x.isEmpty())
+        return ErrEmptyInput;
+    const Path path = DirectPath(!a.isEmpty(), !b.isEmpty());
+    if (path == Path::Nothing)
+        return 0;
+    if (path == Path::Missing)
+        return EmptiedOnFailure(x, ErrSizesDisagree);
+    if (const Outcome bad = FitBoth(xState, b.size(), yState, a.size(), clears))
+        return bad;
+    return EmptiedOnFailure(
+        x, RunDirect(path, a, b, xState.data(), yState.data(), x.data(), x.size(), x.data()));
+}
+
+// A real signal through a complex filter.
+Outcome FilterIntoComplex(In<DBL1D> x, Out<CDB1D> y, In<CDB1D> a, In<CDB1D> b, Kept<DBL1D> xState,
+                          Kept<CDB1D> yState, bool clears) {
+    if (x.isEmpty())
+        return ErrEmptyInput;
+    const Path path = DirectPath(!a.isEmpty(), !b.isEmpty());
+    if (path == Path::Missing)
+        return ErrSizesDisagree;
+    if (const Outcome bad = y.resize(x.size()))
+        return bad;
+    if (path == Path::Nothing) {
+        for (std::ptrdiff_t t = 0; t < x.size(); ++t)
+            y.data()[t] = {x.data()[t], 0.0};
+        return 0;
+    }
+    if (const Outcome bad = FitBoth(xState, b.size(), yState, a.size(), clears))
+        return bad;
+    return RunDirect(path, a, b, xState.data(), yState.data(), x.data(), x.size(), y.data());
+}
+
+// The state of x and that of y in one array.
+template <class State>
+Outcome RunJoined(Path path, const In<DBL1D> &a, const In<DBL1D> &b, State &state, bool clears,
+                  typename State::T *x, int32_t n) {
+    const int32_t ofX = Memory(b.size());
+    const int32_t ofY = path == Path::IIR ? Memory(a.size()) : 0;
+    if (ofX > std::numeric_limits<int32_t>::max() - ofY)
+        return ErrOutOfMemory;
+    if (const Outcome bad = Fit(state, ofX + ofY, clears))
+        return bad;
+    if (clears)
+        Clear(state);
+    return RunDirect(path, a, b, state.data(), state.data() + ofX, x, n, x);
+}
+
+template <class Signal>
+Outcome FilterOneState(InOut<Signal> x, In<DBL1D> a, In<DBL1D> b, InOut<Signal> state,
+                       bool clears) {
+    if (x.isEmpty())
+        return ErrEmptyInput;
+    const Path path = DirectPath(!a.isEmpty(), !b.isEmpty());
+    if (path == Path::Nothing)
+        return 0;
+    if (path == Path::Missing)
+        return ErrSizesDisagree;
+    return RunJoined(path, a, b, state, clears, x.data(), x.size());
+}
+
+template <class State>
+Outcome RunCascade(int32_t form, const In<DBL1D> &a, const In<DBL1D> &b, State &state, bool clears,
+                   typename State::T *x, int32_t n) {
+    const int32_t order = SectionOrder(form);
+    if (const Outcome bad = Fit(state, a.size() / order * order, clears))
+        return bad;
+    if (clears)
+        Clear(state);
+    return FilterIIRCascade({a.data(), a.size(), b.data(), b.size(), form}, state.data(),
+                            state.size(), x, n);
+}
+
+template <class Signal>
+Outcome FilterCascade(Kept<Signal> x, int32_t form, In<DBL1D> a, In<DBL1D> b, Kept<Signal> state,
+                      bool clears) {
+    if (x.isEmpty())
+        return ErrEmptyInput;
+    const Path path = CascadePath(!a.isEmpty(), !b.isEmpty());
+    if (path == Path::Nothing)
+        return 0;
+    if (path == Path::Missing)
+        return EmptiedOnFailure(x, ErrSizesDisagree);
+    // kept: unlike the other codes this one leaves x as it is.
+    if (SectionOrder(form) == 0)
+        return ErrInvalidSelector;
+    const Outcome outcome = RunCascade(form, a, b, state, clears, x.data(), x.size());
+    return outcome.isHosts() ? outcome : EmptiedOnFailure(x, outcome);
+}
+
+enum SampleMode : int32_t { SecondOrderSections = 0, FourthOrderSections, DirectIIR, DirectFIR };
+
+template <class State>
+Outcome RunSample(typename State::T *x, int32_t mode, const In<DBL1D> &a, const In<DBL1D> &b,
+                  State &state, bool clears) {
+    if (mode < SecondOrderSections || mode > DirectFIR)
+        return ErrInvalidSelector;
+    const bool isCascade = mode < DirectIIR;
+    // kept: with the numerator at hand the FIR mode does not look at a, without it does.
+    const bool hasA = !a.isEmpty() && (mode != DirectFIR || b.isEmpty());
+    const Path path = isCascade ? CascadePath(hasA, !b.isEmpty()) : DirectPath(hasA, !b.isEmpty());
+    if (path == Path::Nothing)
+        return 0;
+    if (path == Path::Missing)
+        return ErrSizesDisagree;
+    if (isCascade)
+        return RunCascade(mode, a, b, state, clears, x, 1);
+    return RunJoined(path, a, b, state, clears, x, 1);
+}
+
+// kept: a failure leaves 0 in the sample, and not the NaN of other scalars.
+template <class Signal>
+Outcome FilterSample(typename HandleTraits<Signal>::T *x, int32_t mode, In<DBL1D> a, In<DBL1D> b,
+                     InOut<Signal> state, bool clears) {
+    const Outcome outcome = RunSample(x, mode, a, b, state, clears);
+    if (outcome.failed())
+        *x = {};
+    return outcome;
+}
+
+} // namespace
+} // namespace qx
+
+using qx::ClearsIfReset;
+using qx::ClearsUnlessKept;
+using qx::InErrWithHost;
+using qx::Returned;
+
+int32_t IIR_Filter(DBL1D x, DBL1D a, DBL1D b, DBL1D xState, DBL1D yState, const uint8_t *keepState,
+                   ErrorCode *err) {
+    return InErrWithHost(err, qx::FilterTwoStates<DBL1D, DBL1D>, x, a, b, xState, yState,
+                         ClearsUnlessKept(keepState));
+}
+
+int32_t CxSigIIR_Filter(CDB1D x, DBL1D a, DBL1D b, CDB1D xState, CDB1D yState,
+                        const uint8_t *keepState, ErrorCode *err) {
+    return InErrWithHost(err, qx::FilterTwoStates<CDB1D, DBL1D>, x, a, b, xState, yState,
+                         ClearsUnlessKept(keepState));
+}
+
+int32_t CxIIR_Filter_H(CDB1D x, CDB1D a, CDB1D b, CDB1D xState, CDB1D yState,
+                       const uint8_t *keepState, ErrorCode *err) {
+    return InErrWithHost(err, qx::FilterTwoStates<CDB1D, CDB1D>, x, a, b, xState, yState,
+                         ClearsUnlessKept(keepState));
+}
+
+ErrorCode CxIIRReSig_Filter_H(DBL1D x, CDB1D y, CDB1D a, CDB1D b, DBL1D xState, CDB1D yState,
+                              const uint8_t *keepState) {
+    return Returned(qx::FilterIntoComplex, x, y, a, b, xState, yState, ClearsUnlessKept(keepState));
+}
+
+ErrorCode IIR_Filter_OneState(DBL1D x, DBL1D a, DBL1D b, DBL1D state, const uint8_t *keepState) {
+    return Returned(qx::FilterOneState<DBL1D>, x, a, b, state, ClearsUnlessKept(keepState));
+}
+
+ErrorCode CxSigIIR_Filter_OneState(CDB1D x, DBL1D a, DBL1D b, CDB1D state,
+                                   const uint8_t *keepState) {
+    return Returned(qx::FilterOneState<CDB1D>, x, a, b, state, ClearsUnlessKept(keepState));
+}
+
+int32_t IIR_Filter2(DBL1D x, const int32_t *form, DBL1D a, DBL1D b, DBL1D state,
+                    const uint8_t *keepState, ErrorCode *err) {
+    return InErrWithHost(err, qx::FilterCascade<DBL1D>, x, *form, a, b, state,
+                         ClearsUnlessKept(keepState));
+}
+
+int32_t CxSigIIR_Filter2(CDB1D x, const int32_t *form, DBL1D a, DBL1D b, CDB1D state,
+                         const uint8_t *keepState, ErrorCode *err) {
+    return InErrWithHost(err, qx::FilterCascade<CDB1D>, x, *form, a, b, state,
+                         ClearsUnlessKept(keepState));
+}
+
+ErrorCode IIR_Filter_PtbyPt(DBL *x, int32_t mode, DBL1D a, DBL1D b, DBL1D state,
+                            const uint8_t *reset) {
+    return Returned(qx::FilterSample<DBL1D>, x, mode, a, b, state, ClearsIfReset(reset));
+}
+
+ErrorCode CxSigIIR_Filter_PtbyPt(CDB *x, int32_t mode, DBL1D a, DBL1D b, CDB1D state,
+                                 const uint8_t *reset) {
+    return Returned(qx::FilterSample<CDB1D>, x, mode, a, b, state, ClearsIfReset(reset));
+}
