@@ -21,7 +21,7 @@ QX_BEGIN_DECLS
 typedef struct Interval {
     double lower, upper;
     int32_t closure;
-    Array1DHandle edges;
+    DBL1D edges;
     int32_t spare[2];
 } Interval;
 typedef QX_ARRAY_1D(Interval) Interval1D;
@@ -89,6 +89,9 @@ class Reading(unittest.TestCase):
         self.assertEqual((forget["arguments"], forget["documentation"]), ([], "No arguments."))
         self.assertEqual([f["name"] for f in result["records"]["Interval"]["fields"]],
                          ["lower", "upper", "closure", "edges", "spare"])
+        self.assertEqual([(f.get("element"), f.get("array"), f.get("dimensions"))
+                          for f in result["records"]["Interval"]["fields"]][2:4],
+                         [("I32", None, None), (None, "DBL", 1)])
         self.assertTrue(result["records"]["WorkspaceStatus"]["packed"])
         self.assertEqual(result["families"], [{
             "name": "shapes", "header": "qx/shapes.h",

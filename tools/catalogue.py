@@ -184,6 +184,8 @@ class Types:
             field = {"name": name, "type": base + (" " + stars if stars else "")}
             if not stars and base in SCALARS:
                 field["element"] = SCALARS[base]
+            if not stars and base in self.handles:
+                field["dimensions"], field["array"] = self.handles[base]
             if count:
                 field["count"] = count
             fields.append(field)

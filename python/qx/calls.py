@@ -13,13 +13,14 @@ import numpy as np
 from . import arrays, plans
 from .library import library
 
-C_TYPES = {"I16": ctypes.c_int16, "I32": ctypes.c_int32, "U8": ctypes.c_uint8, "U32": ctypes.c_uint32,
-           "SGL": ctypes.c_float, "DBL": ctypes.c_double}
+C_TYPES = {"I16": ctypes.c_int16, "I32": ctypes.c_int32, "U8": ctypes.c_uint8,
+           "U32": ctypes.c_uint32, "SGL": ctypes.c_float, "DBL": ctypes.c_double}
 COMPLEX_PARTS = {"CSG": ctypes.c_float, "CDB": ctypes.c_double}
 RESULTS = {"ErrorCode": ctypes.c_int32, "int32_t": ctypes.c_int32, "uint32_t": ctypes.c_uint32,
            "uint8_t": ctypes.c_uint8, "double": ctypes.c_double, "DBL": ctypes.c_double,
            "float": ctypes.c_float, "void": None}
-INTEGER_LIMITS = {"I16": (-2**15, 2**15 - 1), "I32": (-2**31, 2**31 - 1), "U32": (0, 2**32 - 1), "U8": (0, 255)}
+INTEGER_LIMITS = {"I16": (-2**15, 2**15 - 1), "I32": (-2**31, 2**31 - 1), "U32": (0, 2**32 - 1),
+                  "U8": (0, 255)}
 HOST_FAILURES = (1, 2)  # statuses of the host that some exports pass on
 
 
@@ -71,17 +72,45 @@ def plain(c_value, element):
 
 @functools.lru_cache(maxsize=None)
 def record_type(name):
-    """The ctypes structure of a record."""
+    """The ctypes structure of a record; arrays in it are handles."""
     description = library().records[name]
     fields = []
     for field in description["fields"]:
+        if "array" in field:
+            fields.append((field["name"], ctypes.c_void_p))
+            continue
         if "element" not in field or "count" in field or field["element"] in COMPLEX_PARTS:
-            raise TypeError(f"records of type {name} hold more than plain numbers")
+            raise TypeError(f"records of type {name} hold more than numbers and arrays")
         fields.append((field["name"], C_TYPES[field["element"]]))
     body = {"_fields_": fields}
     if description["packed"]:
         body = {"_pack_": 1, **body}
     return type(name, (ctypes.Structure,), body)
+
+
+class Record:
+    """A record for a call, with the blocks of the arrays in it."""
+
+    def __init__(self, name, contents, argument):
+        self.record = record_type(name)()
+        self.blocks = {}
+        fields = {field["name"]: field for field in library().records[name]["fields"]}
+        for field in contents:
+            if field not in fields:
+                raise ValueError(f"{argument}: {name} has no field {field!r}")
+        for field, description in fields.items():
+            if "array" in description:
+                element, dimensions = description["array"], description["dimensions"]
+                block = (arrays.filled(contents[field], element, dimensions, field, reuse=False)
+                         if field in contents else arrays.empty(element, dimensions))
+                self.blocks[field] = block
+                setattr(self.record, field, block.handle)
+            elif field in contents:
+                setattr(self.record, field, contents[field])
+
+    def contents(self):
+        return {field: self.blocks[field].view() if field in self.blocks
+                else getattr(self.record, field) for field, _ in self.record._fields_}
 
 
 class Export:
@@ -179,12 +208,8 @@ class Export:
             word = plans.word((self.name, name, lengths), argument)
             return ctypes.c_void_p(word.address), word
         if kind == "record":
-            record = record_type(element)()
-            for field, content in (value or {}).items():
-                if field not in dict(record._fields_):
-                    raise ValueError(f"{name}: {element} has no field {field!r}")
-                setattr(record, field, content)
-            return ctypes.byref(record), record
+            record = Record(element, value or {}, name)
+            return ctypes.byref(record.record), record
         if kind == "opaque":
             pointer = ctypes.c_void_p(value)
             return (ctypes.byref(pointer) if argument["direction"] == "out" else pointer), pointer
@@ -198,7 +223,7 @@ class Export:
             if argument["kind"].startswith("array"):
                 results.append(keep.view())
             elif argument["kind"] == "record":
-                results.append({field: getattr(keep, field) for field, _ in keep._fields_})
+                results.append(keep.contents())
             elif argument["kind"] == "opaque":
                 results.append(keep.value)
             else:
@@ -270,8 +295,8 @@ def call(name, *positional, **named):
     """Calls an export.
 
     Inputs are given in the order of the declaration: arrays as anything that NumPy takes, scalars
-    as numbers whether they travel by value or by reference, records as dictionaries, arrays of
-    records as lists of tuples. Outputs come back in the order of the declaration, arrays as NumPy
+    as numbers whether they travel by value or by reference, records as dictionaries (fields left
+    out are 0 or empty), arrays of records as lists of tuples. Outputs come back in the order of the declaration, arrays as NumPy
     arrays, a single one bare and several as a tuple; an array that is input and output comes back
     as a new one. Plans are kept behind the scenes. A failure raises QxError, a warning is given
     as QxWarning. A function of scalars maps over arrays.

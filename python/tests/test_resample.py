@@ -1,0 +1,125 @@
+"""The command resample: WAV files at another rate."""
+
+import os
+import subprocess
+import sys
+import tempfile
+import unittest
+from pathlib import Path
+from unittest import mock
+
+PYTHON = str(Path(__file__).resolve().parent.parent)
+sys.path.insert(0, PYTHON)
+
+import numpy as np
+import soundfile
+
+import qx
+from qx import resampling
+
+
+def tone(frequency, rate, n):
+    """Two channels, the second a quarter period later."""
+    t = np.arange(n)[:, np.newaxis] / rate
+    return np.sin(2 * np.pi * (frequency * t + np.array([0, 0.25])))
+
+
+def decibel(values):
+    return 20 * np.log10(np.abs(values).max())
+
+
+class Resample(unittest.TestCase):
+    def setUp(self):
+        folder = tempfile.TemporaryDirectory()
+        self.addCleanup(folder.cleanup)
+        self.source, self.target = (os.path.join(folder.name, name) for name in ("in.wav", "out.wav"))
+
+    def command(self, *arguments):
+        return subprocess.run([sys.executable, "-m", "qx", "resample", *arguments], text=True,
+                              capture_output=True, env={**os.environ, "PYTHONPATH": PYTHON})
+
+    def test_tones_keep_their_frequency_phase_and_level(self):
+        for rate, new_rate, n in ((48000, 44100, 48001), (44100, 48000, 70000), (8000, 44100, 900),
+                                  (44100, 11025, 100001), (1000, 999, 3000)):
+            with self.subTest(rate=rate, new_rate=new_rate):
+                frequency = 0.4 * min(rate, new_rate)
+                soundfile.write(self.source, tone(frequency, rate, n), rate, "DOUBLE")
+                ran = self.command(self.source, self.target, "--rate", str(new_rate))
+                self.assertEqual(ran.stderr, "")
+                sound, found_rate = soundfile.read(self.target)
+                self.assertEqual(found_rate, new_rate)
+                self.assertEqual(soundfile.info(self.target).subtype, "DOUBLE")
+                self.assertEqual(len(sound), -(-n * new_rate // rate))
+                self.assertIn(f"{len(sound)} frames at {new_rate} Hz", ran.stdout)
+                edge = 200 * max(1, new_rate // rate)  # where the windows meet both ends
+                difference = sound - tone(frequency, new_rate, len(sound))
+                self.assertLess(decibel(difference[edge:-edge]), -118)
+
+    def test_what_the_new_rate_cannot_hold_does_not_come_back(self):
+        for rate, new_rate in ((48000, 44100), (96000, 44100), (44100, 8000)):
+            stream = resampling.Resampler(rate, new_rate, 2)
+            for frequency in np.linspace(new_rate / 2, rate / 2, 20):
+                stream.__init__(rate, new_rate, 2)
+                sound = stream.put(tone(frequency, rate, 6000))
+                self.assertLess(decibel(sound[400:]), -120)
+
+    def test_the_memory_does_not_grow_with_the_length(self):
+        soundfile.write(self.source, np.zeros((400_000, 1)), 48000, "PCM_16")
+        sizes = []
+        real_call = resampling.call
+
+        def call(name, x, *others):
+            results = real_call(name, x, *others)
+            sizes.append(max(x.size, results[3].size))
+            return results
+
+        with mock.patch.object(resampling, "call", call), resampling.opened(self.source) as source:
+            steps = []
+            done = resampling.resample_file(source, self.target, 44100, steps.append)
+        self.assertEqual(sum(steps), 400_000)
+        self.assertEqual((done.read, soundfile.info(self.target).frames), (400_000, 367_500))
+        self.assertEqual(soundfile.info(self.target).subtype, "PCM_16")
+        self.assertLessEqual(max(sizes), resampling.FRAMES_AT_ONCE)
+
+    def test_large_factors_share_the_positions_of_a_call(self):
+        stream = resampling.Resampler(44100, 44101, 1)
+        sound = np.concatenate([stream.put(tone(1000, 44100, 40000)[:, :1]), stream.end()])
+        self.assertEqual(len(sound), 40001)
+        self.assertLess(decibel((sound - tone(1000, 44101, 40001)[:, :1])[200:-200]), -118)
+
+    def test_a_record_with_arrays_carries_a_stream_from_call_to_call(self):
+        side, oversample = 8, 64
+        t = np.arange(-side * oversample, side * oversample + 1) / oversample
+        kernel = np.sinc(t) * np.kaiser(t.size, 8.0) / oversample
+        design = {"ratio": 1.37, "mode": 0, "start": 20.0, "proto": kernel,
+                  "oversample": oversample}
+        x = np.cos(0.3 * np.arange(500))
+        state, sound = {}, []
+        for block in (x[:7], x[7:300], x[300:]):
+            state, y, count = qx.call("Resample_Const", block, state, design, int(not state), 1)
+            sound.append(y[:count])
+        sound = np.concatenate(sound)
+        times = 20 + 1.37 * np.arange(len(sound))
+        self.assertGreater(times[-1], 480)
+        self.assertLess(decibel(sound - np.cos(0.3 * times)), -60)
+        self.assertEqual(state["history"].dtype, np.float64)
+        with self.assertRaisesRegex(ValueError, "no field 'hist'"):
+            qx.call("Resample_Const", x, {"hist": x}, design, 1, 1)
+
+    def test_every_failure_is_one_line_and_leaves_no_file(self):
+        soundfile.write(self.source, tone(100, 8000, 50), 8000)
+        for source, target, rate, reason in (
+                ("nowhere.wav", self.target, "8000", "no such file"),
+                (__file__, self.target, "8000", "cannot be read as audio"),
+                (self.source, "/nowhere/out.wav", "44100", "cannot be written"),
+                (self.source, self.target, "7999993", "common divisor"),
+                (self.source, self.target, "0", "not between")):
+            with self.subTest(reason=reason):
+                ran = self.command(source, target, "--rate", rate)
+                self.assertEqual(ran.returncode, 2)
+                self.assertIn(reason, ran.stderr.splitlines()[-1])
+                self.assertEqual(os.listdir(os.path.dirname(self.target)), ["in.wav"])
+
+
+if __name__ == "__main__":
+    unittest.main()
