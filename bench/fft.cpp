@@ -12,10 +12,11 @@
 
 namespace {
 
+using qx::PlanReference;
+using qx::bench::Cell;
 using qx::bench::FFTWPlan;
 using qx::bench::MedianTimes;
 using qx::bench::Ratios;
-using qx::PlanReference;
 
 #ifdef QX_PEER_FFTW3
 // FFTW over as many blocks of data as ours.

@@ -29,7 +29,9 @@ __attribute__((visibility("default"))) int32_t HostBlockReshape(int32_t, int32_t
 
 namespace {
 
+using qx::bench::Keep;
 using qx::bench::Median;
+using qx::bench::MedianTimes;
 using qx::bench::Ratios;
 using qx::bench::SecondsOf;
 
@@ -108,11 +110,11 @@ void CompareCalls() {
     const auto times = MedianTimes(
         [] {
             for (int i = 0; i < calls; ++i)
-                Keep(qx::WholeKernelsOf(length));
+                Keep(qx::WholeOf(length));
         },
         [] {
             for (int i = 0; i < calls; ++i)
-                Keep(qx::baseline::WholeKernelsOf(length));
+                Keep(qx::baseline::WholeOf(length));
         });
     std::printf("call by width %.2f ns, direct call %.2f ns\n", times[0] / calls * 1e9,
                 times[1] / calls * 1e9);

@@ -157,6 +157,32 @@ bool LeafHasKernels(const FFTPlan &plan) {
     return plan.kinds[plan.factorCount - 1] == KernelFactor;
 }
 
+// Whole transforms at any strides.
+void WholeComplex(const FFTPlan &plan, const DBL *inRe, const DBL *inIm, DBL *outRe, DBL *outIm,
+                  ptrdiff_t inStride, ptrdiff_t outStride) {
+    DBL x[2 * longestWhole];
+    DBL y[2 * longestWhole];
+    for (ptrdiff_t j = 0; j < plan.length; ++j) {
+        x[2 * j] = inRe[j * inStride];
+        x[2 * j + 1] = inIm[j * inStride];
+    }
+    plan.whole.complex(x, y);
+    for (ptrdiff_t k = 0; k < plan.length; ++k) {
+        outRe[k * outStride] = y[2 * k];
+        outIm[k * outStride] = y[2 * k + 1];
+    }
+}
+void WholeReal(const FFTPlan &plan, const DBL *in, DBL *out, ptrdiff_t inStride,
+               ptrdiff_t outStride) {
+    DBL x[longestWhole];
+    DBL h[longestWhole];
+    for (ptrdiff_t j = 0; j < plan.length; ++j)
+        x[j] = in[j * inStride];
+    plan.whole.real(x, h);
+    for (ptrdiff_t k = 0; k < plan.length; ++k)
+        out[k * outStride] = h[k];
+}
+
 // Sums and differences of mirrored elements: half-complex form to Hartley form and back.
 void MirrorSums(DBL *values, ptrdiff_t stride, ptrdiff_t n) {
     for (ptrdiff_t k = 1; k <= (n + 1) / 2 - 1; ++k) {
@@ -172,11 +198,11 @@ void MirrorSums(DBL *values, ptrdiff_t stride, ptrdiff_t n) {
 ErrorCode ExecuteComplex(const FFTPlan &plan, const DBL *inRe, const DBL *inIm, DBL *outRe,
                          DBL *outIm, ptrdiff_t inStride, ptrdiff_t outStride) {
     const bool interleaved = inIm == inRe + 1 && outIm == outRe + 1 && outStride == 2;
-    if (plan.whole != nullptr) {
+    if (plan.whole.complex != nullptr) {
         if (interleaved && inStride == 2)
-            plan.whole->complexSideBySide(inRe, outRe);
+            plan.whole.complex(inRe, outRe);
         else
-            plan.whole->complexLeaf(inRe, inIm, outRe, outIm, inStride, outStride, 1);
+            WholeComplex(plan, inRe, inIm, outRe, outIm, inStride, outStride);
         return 0;
     }
     if (plan.factorCount == 0) {
@@ -195,11 +221,11 @@ ErrorCode ExecuteComplex(const FFTPlan &plan, const DBL *inRe, const DBL *inIm, 
 
 ErrorCode ExecuteReal(const FFTPlan &plan, const DBL *in, DBL *out, ptrdiff_t inStride,
                       ptrdiff_t outStride) {
-    if (plan.whole != nullptr) {
+    if (plan.whole.real != nullptr) {
         if (inStride == 1 && outStride == 1)
-            plan.whole->realSideBySide(in, out);
+            plan.whole.real(in, out);
         else
-            plan.whole->realLeaf(in, out, inStride, outStride, 1);
+            WholeReal(plan, in, out, inStride, outStride);
         return 0;
     }
     if (plan.factorCount == 0) {

@@ -224,11 +224,8 @@ void FillKernels(FFTPlan *plan) {
         plan->realTwiddle[s] = kernels->realTwiddle;
         plan->complexLeaf[s] = kernels->complexLeaf;
         plan->complexTwiddle[s] = kernels->complexTwiddle;
-        if (plan->factorCount == 1)
-            plan->whole = kernels;
     }
-    if (plan->factorCount > 1)
-        plan->whole = WholeKernelsOf(plan->length);
+    plan->whole = WholeOf(plan->length);
 }
 
 // Releases a plan, whole or as far as it was built.

@@ -28,6 +28,15 @@ typedef void (*ComplexTwiddle)(DBL *re, DBL *im, const DBL *twiddleCos, const DB
 
 struct KernelSet;
 
+// Straight-line transforms of one length, input and results side by side; null where there are
+// none.
+struct WholeTransform {
+    void (*complex)(const DBL *in, DBL *out); // interleaved
+    void (*real)(const DBL *in, DBL *out);
+};
+// The longest of them.
+constexpr int32_t longestWhole = 64;
+
 // How the p-point transform of a factor p is done: by a kernel of straight-line code, as a plain
 // sum (a prime below 50 that has no kernel), or by Rader's algorithm (any other prime).
 enum FactorKind : int32_t { KernelFactor = 0, DirectPrime = 1, RaderPrime = 2 };
@@ -70,9 +79,9 @@ struct FFTPlan {
     qx::ComplexTwiddle complexTwiddle[maxFactors];
     FFTPlan *prev, *next; // the cache
 
-    // The kernels that transform this length in one call: those of the only factor, or of a small
-    // length with several, where the stages would cost more than the arithmetic; else null.
-    const qx::KernelSet *whole;
+    // Of a small length, which is transformed in one call: the stages of one with several factors
+    // would cost more than the arithmetic.
+    qx::WholeTransform whole;
 
     // Twiddles of the cosine transforms, built by QuarterWave at its first call; else null.
     mutable std::atomic<const double *> quarterWave;

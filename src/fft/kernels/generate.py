@@ -1,6 +1,7 @@
 #!/usr/bin/python3
-"""Writes the straight-line transforms of the radices: one file kernels_<p>.cpp per radix, and one
-for each of a few small lengths that are transformed whole.
+"""Writes the straight-line transforms of the radices: one file kernels_<p>.cpp per radix, one for
+each of a few small lengths that are transformed whole, and kernels_choice.cpp. Beside a complex
+transform stands the real one of twice its length that is made of it.
 
     generate.py FOLDER
 
@@ -14,7 +15,7 @@ Each file holds four texts over a lane type V:
                           frequencies, X[q] = sum over j of x[j] exp(-2 pi i j (q + 1/2) / p),
                           2q + 1 < p
 
-The files of the whole lengths have the first and the third.
+The files of the whole lengths have the first and, for odd p, the third.
 
 All do the same arithmetic on the parts of each value, so packed and split data give the same bits.
 
@@ -39,10 +40,13 @@ from pathlib import Path
 getcontext().prec = 60
 
 RADICES = [2, 3, 4, 5, 7, 8, 9, 10, 11, 13, 14, 16, 17, 18, 19, 29, 31, 32, 37, 41, 43]
-# Lengths of two factors that are transformed whole.
-WHOLE = [6, 12]
+# Lengths of several factors that are transformed whole.
+WHOLE = [6, 12, 15, 20, 24, 28, 30, 36, 40, 48]
+# Real transforms of these are complex ones of half the length; below 20 the direct ones are faster.
+BY_HALF = [n for n in range(20, 65, 2) if n // 2 in RADICES + WHOLE]
 # Composite length -> its factor r; coprime factors are recognised.
-SPLIT = {4: 2, 6: 2, 8: 2, 9: 3, 10: 2, 12: 3, 14: 2, 16: 4, 18: 2, 32: 4}
+SPLIT = {4: 2, 6: 2, 8: 2, 9: 3, 10: 2, 12: 3, 14: 2, 15: 3, 16: 4, 18: 2, 20: 4,
+         24: 3, 28: 4, 30: 5, 32: 4, 36: 4, 40: 5, 48: 3}
 
 
 # ---- Exact constants -----------------------------------------------------------------------
@@ -407,17 +411,49 @@ def odd_text(p):
 
 
 def file_of(p):
-    texts = [packed_text(p), real_text(p)]
+    by_half = p in BY_HALF
+    texts = [packed_text(p)]
+    if p in RADICES or not by_half:
+        texts.append(real_text(p))
     if p in RADICES:
         texts += [split_text(p)] + ([odd_text(p)] if p % 2 == 0 else [])
-    maker = "MakeKernels" if p in RADICES else "MakeWholeKernels"
-    return "\n".join([
-        f"// The kernels of {p}, made by fft/kernels/generate.py.\n",
-        "#include \"fft/kernels/kernel_set.h\"\n\nnamespace qx::QX_WIDTH {\n",
-        *texts,
-        f"template <>\nconst KernelSet *KernelsFor<{p}>() {{",
-        f"    static constexpr KernelSet kernels = {maker}<{p}>();\n    return &kernels;\n}}\n",
-        "} // namespace qx::QX_WIDTH\n"])
+        texts.append(f"template <>\nconst KernelSet *KernelsFor<{p}>() {{\n"
+                     f"    static constexpr KernelSet kernels = MakeKernels<{p}>();\n"
+                     "    return &kernels;\n}\n")
+    for part in ["Complex"] if by_half else ["Complex", "Real"]:
+        texts.append(side_by_side(part, p, f"Whole{part}Transform<{p}>(in, out);"))
+    if 2 * p in BY_HALF:
+        turns = [part(k, 2 * p) / 2 for k in range(1, (p + 1) // 2) for part in (cos_turn, sin_turn)]
+        texts.append(side_by_side("Real", 2 * p,
+                                  "static constexpr double turns[] = "
+                                  f"{{{', '.join(repr(float(x)) for x in turns)}}};\n"
+                                  f"    RealByHalf<{2 * p}>(in, out, turns);"))
+    return enclosed(f"The kernels of {p}", texts)
+
+
+def side_by_side(part, n, body):
+    return f"template <>\nvoid {part}SideBySide<{n}>(const DBL *in, DBL *out) {{\n    {body}\n}}\n"
+
+
+def choice_file():
+    """What there is, for the choice at run time."""
+    kernels = [f"    case {p}:\n        return KernelsFor<{p}>();" for p in sorted(RADICES)]
+    complex_lengths = {*RADICES, *WHOLE}
+    wholes = []
+    for n in sorted({*complex_lengths, *BY_HALF}):
+        of_complex = f"ComplexSideBySide<{n}>" if n in complex_lengths else "nullptr"
+        wholes.append(f"    case {n}:\n        return {{{of_complex}, RealSideBySide<{n}>}};")
+    return enclosed("The choice of kernels", [
+        "const KernelSet *KernelsOf(int32_t radix) {\n    switch (radix) {",
+        *kernels, "    default:\n        return nullptr;\n    }\n}\n",
+        "WholeTransform WholeOf(int32_t length) {\n    switch (length) {",
+        *wholes, "    default:\n        return {};\n    }\n}\n"])
+
+
+def enclosed(title, texts):
+    return "\n".join([f"// {title}, made by fft/kernels/generate.py.\n",
+                      "#include \"fft/kernels/whole.h\"\n\nnamespace qx::QX_WIDTH {\n",
+                      *texts, "} // namespace qx::QX_WIDTH\n"])
 
 
 def main():
@@ -425,6 +461,7 @@ def main():
     folder.mkdir(parents=True, exist_ok=True)
     for p in RADICES + WHOLE:
         (folder / f"kernels_{p}.cpp").write_text(file_of(p))
+    (folder / "kernels_choice.cpp").write_text(choice_file())
 
 
 if __name__ == "__main__":

@@ -94,11 +94,6 @@ __attribute__((noinline)) void ComplexLeafColumn(const ColumnIn &in, const Colum
 }
 
 template <int P>
-void ComplexSideBySide(const DBL *in, DBL *out) {
-    RunPacked<P, One>(SideBySideIn{in}, SideBySideOut{out});
-}
-
-template <int P>
 __attribute__((noinline)) void ComplexLeafRows(const DBL *in, DBL *out,
                                                const LeafColumns &columns) {
     for (ptrdiff_t b = 0; b < columns.count[1]; ++b) {
@@ -142,11 +137,6 @@ void ComplexLanesLeaf(const DBL *in, DBL *out, const LeafColumns &columns) {
 template <int P>
 __attribute__((noinline)) void RealLeafColumn(const RealColumnIn &in, const RealColumnOut &out) {
     RunReal<P, Narrow>(in, out);
-}
-
-template <int P>
-void RealSideBySide(const DBL *in, DBL *out) {
-    RunReal<P, Narrow>(RealColumnIn{in, 1}, RealColumnOut{out, 1});
 }
 
 // Walks over the columns of a leaf.
@@ -403,18 +393,8 @@ void RealLanesTwiddle(DBL *data, const FFTStage &stage, ptrdiff_t m) {
 
 template <int P>
 constexpr KernelSet MakeKernels() {
-    return {RealLeafKernel<P>,       RealTwiddleKernel<P>,   ComplexLeafKernel<P>,
-            ComplexTwiddleKernel<P>, RealLanesLeaf<P>,       RealLanesTwiddle<P>,
-            ComplexLanesLeaf<P>,     ComplexLanesTwiddle<P>, ComplexSideBySide<P>,
-            RealSideBySide<P>};
-}
-
-// Of a length that is transformed whole: there are no stages of it.
-template <int P>
-constexpr KernelSet MakeWholeKernels() {
-    return {RealLeafKernel<P>,    nullptr,          ComplexLeafKernel<P>, nullptr,
-            RealLanesLeaf<P>,     nullptr,          ComplexLanesLeaf<P>,  nullptr,
-            ComplexSideBySide<P>, RealSideBySide<P>};
+    return {RealLeafKernel<P>, RealTwiddleKernel<P>, ComplexLeafKernel<P>, ComplexTwiddleKernel<P>,
+            RealLanesLeaf<P>,  RealLanesTwiddle<P>,  ComplexLanesLeaf<P>,  ComplexLanesTwiddle<P>};
 }
 
 } // namespace qx::QX_WIDTH

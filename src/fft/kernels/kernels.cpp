@@ -7,31 +7,9 @@ namespace {
 
 using std::ptrdiff_t;
 
-template <int... P>
-const KernelSet *Find(int32_t radix) {
-    const KernelSet *found = nullptr;
-    ((radix == P ? found = KernelsFor<P>() : nullptr), ...);
-    return found;
-}
-
 constexpr int packedColumns = nativeLanes / 2;
 
 } // namespace
-
-const KernelSet *KernelsOf(int32_t radix) {
-    return Find<2, 3, 4, 5, 7, 8, 9, 10, 11, 13, 14, 16, 17, 18, 19, 29, 31, 32, 37, 41, 43>(radix);
-}
-
-const KernelSet *WholeKernelsOf(int32_t length) {
-    switch (length) {
-    case 6:
-        return KernelsFor<6>();
-    case 12:
-        return KernelsFor<12>();
-    default:
-        return nullptr;
-    }
-}
 
 int64_t ComplexLanesSize(int32_t p, int32_t m) {
     return int64_t{m / packedColumns} * nativeLanes * (p - 1);

@@ -38,21 +38,22 @@ struct KernelSet {
     void (*realLanesTwiddle)(DBL *data, const FFTStage &stage, std::ptrdiff_t m);
     void (*complexLanesLeaf)(const DBL *in, DBL *out, const LeafColumns &columns);
     void (*complexLanesTwiddle)(DBL *data, const FFTStage &stage, std::ptrdiff_t m);
-    // One transform, its input side by side too.
-    void (*complexSideBySide)(const DBL *in, DBL *out);
-    void (*realSideBySide)(const DBL *in, DBL *out);
 };
 
 // The kernels of one of kernelRadices.
 QX_BY_WIDTH(const KernelSet *, KernelsOf, (int32_t radix))
-// Those of a length that is transformed whole although it has several factors, 6 or 12, else null.
-// They have no twiddle kernels.
-QX_BY_WIDTH(const KernelSet *, WholeKernelsOf, (int32_t length))
+// The transforms of one length in one call.
+QX_BY_WIDTH(WholeTransform, WholeOf, (int32_t length))
 
 namespace QX_WIDTH {
 template <int P>
 const KernelSet *KernelsFor();
-}
+// One transform, interleaved and side by side.
+template <int P>
+void ComplexSideBySide(const DBL *in, DBL *out);
+template <int P>
+void RealSideBySide(const DBL *in, DBL *out);
+} // namespace QX_WIDTH
 
 // The lane tables hold the twiddles of a stage with factor p in the order in which the kernels read
 // them: block after block of columns, as many as fill the lanes, and in a block entry by entry of
