@@ -4,6 +4,7 @@
 /* Every export of the module. */
 
 #include "qx/anova.h"
+#include "qx/chirp_z.h"
 #include "qx/convolution.h"
 #include "qx/convolution_2d.h"
 #include "qx/decimation.h"

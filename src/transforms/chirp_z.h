@@ -1,0 +1,37 @@
+#ifndef QX_TRANSFORMS_CHIRP_Z_H
+#define QX_TRANSFORMS_CHIRP_Z_H
+
+#include "frame/elements.h"
+#include "qx/errors.h"
+
+#include <cstdint>
+
+namespace qx {
+
+// The z-transform of n values on a spiral of `count` points, X[m] = sum over k of x[k] a^(-k)
+// w^(k m). A power z^p is exp(i p arg z) times (|z|^2)^(p/2).
+//
+// ErrNonFiniteInput (a), ErrNotStrictlyPositive (a is 0), the same two of w, ErrOutOfMemory.
+enum ChirpMethod : uint32_t {
+    DirectSum = 0, // n count powers
+    Bluestein = 1, // one convolution by transforms, n + count powers
+};
+
+ErrorCode ChirpZ(const DBL *x, int32_t n, CDB a, CDB w, uint32_t method, CDB *out, int32_t count);
+ErrorCode ChirpZ(const CDB *x, int32_t n, CDB a, CDB w, uint32_t method, CDB *out, int32_t count);
+
+// The inverse: the sequence of `count` values whose transform is the input. Of more input values a
+// stretch of `count` is taken, around the point of the spiral that is nearest to the unit circle.
+//
+// With y[k] = x[k] a^(-k) this is the interpolation of a polynomial at the powers of w, solved by
+// Lagrange's formula: the products of the differences of such points are products of 1 - w^(-j),
+// the sum over the points is a chirp-Z transform with the step 1/w, and the coefficients of the
+// product over all points are Gaussian binomials. The error grows with the condition of the points
+// (docs/accuracy/chirp_z.md).
+//
+// Beside the above: ErrDegenerateValue where two points agree to rounding.
+ErrorCode InverseChirpZ(const CDB *in, int32_t n, CDB a, CDB w, CDB *out, int32_t count);
+
+} // namespace qx
+
+#endif
