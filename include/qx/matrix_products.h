@@ -1,0 +1,61 @@
+#ifndef QX_MATRIX_PRODUCTS_H
+#define QX_MATRIX_PRODUCTS_H
+
+/* Products of matrices and vectors.
+
+   Matrices are blocks of rows and columns, row after row. The code is in *err. Where the host
+   refuses a resize, *err is ErrOutOfMemory and the function result is the host's own status;
+   otherwise the function result is 0. A failure empties the result.
+
+   With `alignedCopy` not 0 the operands are copied into fresh blocks before the work. An export
+   without it works on the host's blocks. Both give the same values. */
+
+#include "qx/types.h"
+
+QX_BEGIN_DECLS
+
+/** Matrix product c = a b of an m by k and a k by n matrix. Where k is 0 every element of c is
+    NaN; where m or n is 0, c has no element. Products of more than 512 terms run through BLAS, and
+    their last bits depend on the processor; smaller ones are summed in ascending order.
+    Codes: ErrInnerDimensionMismatch (a has not as many columns as b has rows), ErrOutOfMemory (no
+    memory, or the host refused the resize). */
+QX_API int32_t MatrixMulAligned_head(QX_IN DBL2D a, QX_IN DBL2D b, QX_OUT DBL2D c,
+                                     int32_t alignedCopy, QX_OUT ErrorCode *err);
+/** As MatrixMulAligned_head, with alignedCopy 0. */
+QX_API int32_t MatrixMul_head(QX_IN DBL2D a, QX_IN DBL2D b, QX_OUT DBL2D c, QX_OUT ErrorCode *err);
+/** As MatrixMulAligned_head, for complex data. */
+QX_API int32_t AxBCxAlignedCIN(QX_IN CDB2D a, QX_IN CDB2D b, QX_OUT CDB2D c, int32_t alignedCopy,
+                               QX_OUT ErrorCode *err);
+/** As AxBCxAlignedCIN, with alignedCopy 0. */
+QX_API int32_t AxBCxCIN(QX_IN CDB2D a, QX_IN CDB2D b, QX_OUT CDB2D c, QX_OUT ErrorCode *err);
+
+/** y = a x: one sum per row, added up from the first column to the last. An empty a or x gives an
+    empty y. alignedCopy changes nothing.
+    Codes: ErrNegativeDimension (a size is below 0), ErrInnerDimensionMismatch (a has not as many
+    columns as x has elements), ErrOutOfMemory (the host refused the resize). */
+QX_API int32_t AxVectAligned_head(QX_IN DBL2D a, QX_IN DBL1D x, QX_OUT DBL1D y, int32_t alignedCopy,
+                                  QX_OUT ErrorCode *err);
+/** As AxVectAligned_head, with alignedCopy 0. */
+QX_API int32_t AxVect_head(QX_IN DBL2D a, QX_IN DBL1D x, QX_OUT DBL1D y, QX_OUT ErrorCode *err);
+/** As AxVectAligned_head, for complex data. */
+QX_API int32_t AxVectorCxAligned(QX_IN CDB2D a, QX_IN CDB1D x, QX_OUT CDB1D y, int32_t alignedCopy,
+                                 QX_OUT ErrorCode *err);
+/** As AxVectorCxAligned, with alignedCopy 0. */
+QX_API int32_t AxVectorCx(QX_IN CDB2D a, QX_IN CDB1D x, QX_OUT CDB1D y, QX_OUT ErrorCode *err);
+
+/** y = x a with x as a matrix of one row, by the product of matrices.
+    Codes: ErrInnerDimensionMismatch (x has not as many elements as a has rows), ErrOutOfMemory (no
+    memory, or the host refused the resize). */
+QX_API int32_t vectxAAligned_head(QX_IN DBL1D x, QX_IN DBL2D a, QX_OUT DBL1D y, int32_t alignedCopy,
+                                  QX_OUT ErrorCode *err);
+/** As vectxAAligned_head, with alignedCopy 0. */
+QX_API int32_t vectxA_head(QX_IN DBL1D x, QX_IN DBL2D a, QX_OUT DBL1D y, QX_OUT ErrorCode *err);
+/** As vectxAAligned_head, for complex data. */
+QX_API int32_t CxVectxAAligned_head(QX_IN CDB1D x, QX_IN CDB2D a, QX_OUT CDB1D y,
+                                    int32_t alignedCopy, QX_OUT ErrorCode *err);
+/** As CxVectxAAligned_head, with alignedCopy 0. */
+QX_API int32_t CxVectxA_head(QX_IN CDB1D x, QX_IN CDB2D a, QX_OUT CDB1D y, QX_OUT ErrorCode *err);
+
+QX_END_DECLS
+
+#endif

@@ -1,0 +1,45 @@
+/* What compiled Fortran asks of its run-time and of the mathematics library. So the module needs
+   no Fortran run-time, and takes no mathematics from the process. */
+
+#include <math.h>
+#include <stddef.h>
+#include <string.h>
+
+/* The result may be longer than both strings together and is then padded. */
+void _gfortran_concat_string(size_t length, char *result, size_t firstLength, const char *first,
+                             size_t secondLength, const char *second) {
+    const size_t fromFirst = firstLength < length ? firstLength : length;
+    const size_t room = length - fromFirst;
+    const size_t fromSecond = secondLength < room ? secondLength : room;
+    memcpy(result, first, fromFirst);
+    memcpy(result + fromFirst, second, fromSecond);
+    memset(result + fromFirst + fromSecond, ' ', room - fromSecond);
+}
+
+double cabs(double _Complex z) { return hypot(__real__ z, __imag__ z); }
+
+/* The principal root: the part that does not cancel first, the other from their product. */
+double _Complex csqrt(double _Complex z) {
+    const double re = __real__ z, im = __imag__ z;
+    double _Complex root = 0.0;
+    if (re == 0.0 && im == 0.0)
+        return root;
+    const double large = sqrt(0.5 * hypot(re, im) + 0.5 * fabs(re));
+    const double small = 0.5 * fabs(im) / large;
+    __real__ root = re >= 0.0 ? large : small;
+    __imag__ root = copysign(re >= 0.0 ? small : large, im);
+    return root;
+}
+
+/* Halves away from zero. */
+long lround(double x) { return (long)(x < 0.0 ? ceil(x - 0.5) : floor(x + 0.5)); }
+long lroundf(float x) { return lround((double)x); }
+float logf(float x) { return (float)log((double)x); }
+
+/* BLAS and LAPACK report a bad argument here, which none of our calls has. The process is the
+   host's: nothing is printed, and nobody is stopped. */
+void xerbla_(const char *name, const int *argument, size_t nameLength) {
+    (void)name;
+    (void)argument;
+    (void)nameLength;
+}

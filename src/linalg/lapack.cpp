@@ -1,0 +1,74 @@
+#include "linalg/lapack.h"
+
+// LAPACK's complex elements are ours.
+#define lapack_complex_float CSG
+#define lapack_complex_double CDB
+#include <cblas.h>
+#include <lapack.h>
+
+namespace qx {
+
+namespace blas {
+
+void Product(int32_t m, int32_t n, int32_t k, const DBL *a, const DBL *b, DBL *c) {
+    cblas_dgemm(CblasRowMajor, CblasNoTrans, CblasNoTrans, m, n, k, 1.0, a, k, b, n, 0.0, c, n);
+}
+
+namespace {
+
+void ComplexProduct(CBLAS_TRANSPOSE transposition, int32_t m, int32_t n, int32_t k, const CDB *a,
+                    const CDB *b, int32_t bCols, CDB *c) {
+    const CDB one = {1.0, 0.0}, zero = {0.0, 0.0};
+    cblas_zgemm(CblasRowMajor, CblasNoTrans, transposition, m, n, k, &one, a, k, b, bCols, &zero, c,
+                n);
+}
+
+} // namespace
+
+void Product(int32_t m, int32_t n, int32_t k, const CDB *a, const CDB *b, CDB *c) {
+    ComplexProduct(CblasNoTrans, m, n, k, a, b, n, c);
+}
+
+void ProductWithConjugate(int32_t m, int32_t n, int32_t k, const CDB *a, const CDB *b, CDB *c) {
+    ComplexProduct(CblasConjTrans, m, n, k, a, b, k, c);
+}
+
+} // namespace blas
+
+namespace lapack {
+
+int32_t SolveBand(int32_t n, int32_t lower, int32_t upper, int32_t rightSides, DBL *band,
+                  int32_t *pivots, DBL *b) {
+    const int32_t leading = 2 * lower + upper + 1;
+    int32_t info = 0;
+    LAPACK_dgbsv(&n, &lower, &upper, &rightSides, band, &leading, pivots, b, &n, &info);
+    return info;
+}
+
+int32_t SolveBand(int32_t n, int32_t lower, int32_t upper, int32_t rightSides, CDB *band,
+                  int32_t *pivots, CDB *b) {
+    const int32_t leading = 2 * lower + upper + 1;
+    int32_t info = 0;
+    LAPACK_zgbsv(&n, &lower, &upper, &rightSides, band, &leading, pivots, b, &n, &info);
+    return info;
+}
+
+int32_t FactorTridiagonal(int32_t n, DBL *lower, DBL *diagonal, DBL *upper, DBL *upper2,
+                          I32 *pivots) {
+    int32_t info = 0;
+    LAPACK_dgttrf(&n, lower, diagonal, upper, upper2, pivots, &info);
+    return info;
+}
+
+int32_t SolveTridiagonal(bool transposed, int32_t n, int32_t rightSides, const DBL *lower,
+                         const DBL *diagonal, const DBL *upper, const DBL *upper2,
+                         const I32 *pivots, DBL *b) {
+    int32_t info = 0;
+    LAPACK_dgttrs(transposed ? "T" : "N", &n, &rightSides, lower, diagonal, upper, upper2, pivots,
+                  b, &n, &info);
+    return info;
+}
+
+} // namespace lapack
+
+} // namespace qx

@@ -1,0 +1,46 @@
+#ifndef QX_LINALG_LAPACK_H
+#define QX_LINALG_LAPACK_H
+
+#include "qx/types.h"
+
+#include <cstdint>
+
+namespace qx {
+
+// What the library calls of BLAS and LAPACK, overloaded by element. Nothing else includes their
+// headers. Their kernels differ between processors, and so do the last bits of what goes through
+// them. LAPACK's matrices are column after column: see TransposeMatrix.
+
+namespace blas {
+
+// c = a b, all row after row: a is m by k, b k by n. The sizes are positive.
+void Product(int32_t m, int32_t n, int32_t k, const DBL *a, const DBL *b, DBL *c);
+void Product(int32_t m, int32_t n, int32_t k, const CDB *a, const CDB *b, CDB *c);
+
+// c = a b^H, all row after row: a is m by k, b n by k.
+void ProductWithConjugate(int32_t m, int32_t n, int32_t k, const CDB *a, const CDB *b, CDB *c);
+
+} // namespace blas
+
+namespace lapack {
+
+// Each returns LAPACK's info: 0, or what the driver's documentation says.
+
+// Solves with a band matrix; `band` has 2 lower + upper + 1 rows per column.
+int32_t SolveBand(int32_t n, int32_t lower, int32_t upper, int32_t rightSides, DBL *band,
+                  int32_t *pivots, DBL *b);
+int32_t SolveBand(int32_t n, int32_t lower, int32_t upper, int32_t rightSides, CDB *band,
+                  int32_t *pivots, CDB *b);
+
+// Factors a tridiagonal matrix, and solves with its factors.
+int32_t FactorTridiagonal(int32_t n, DBL *lower, DBL *diagonal, DBL *upper, DBL *upper2,
+                          I32 *pivots);
+int32_t SolveTridiagonal(bool transposed, int32_t n, int32_t rightSides, const DBL *lower,
+                         const DBL *diagonal, const DBL *upper, const DBL *upper2,
+                         const I32 *pivots, DBL *b);
+
+} // namespace lapack
+
+} // namespace qx
+
+#endif

@@ -1,0 +1,90 @@
+#ifndef QX_LINALG_SCALAR_H
+#define QX_LINALG_SCALAR_H
+
+#include "frame/elements.h"
+
+#include <cmath>
+
+namespace qx {
+
+// Arithmetic that reads the same for real and complex elements, so that an algorithm is one text
+// for both. Complex operations are written out: those of the standard library may go through
+// helper functions with another rounding on another target.
+
+inline CDB operator+(CDB a, CDB b) { return {a.re + b.re, a.im + b.im}; }
+inline CDB operator-(CDB a, CDB b) { return {a.re - b.re, a.im - b.im}; }
+inline CDB operator-(CDB a) { return {-a.re, -a.im}; }
+inline CDB operator*(CDB a, CDB b) {
+    return {a.re * b.re - a.im * b.im, a.re * b.im + a.im * b.re};
+}
+inline CDB operator*(CDB a, double b) { return {a.re * b, a.im * b}; }
+inline CDB operator/(CDB a, double b) { return {a.re / b, a.im / b}; }
+inline CDB &operator+=(CDB &a, CDB b) { return a = a + b; }
+inline CDB &operator-=(CDB &a, CDB b) { return a = a - b; }
+
+// Neither overflows nor underflows before the quotient does (R. L. Smith, "Algorithm 116: Complex
+// division", 1962).
+inline CDB operator/(CDB a, CDB b) {
+    if (std::fabs(b.re) >= std::fabs(b.im)) {
+        const double ratio = b.im / b.re;
+        const double denominator = b.re + b.im * ratio;
+        return {(a.re + a.im * ratio) / denominator, (a.im - a.re * ratio) / denominator};
+    }
+    const double ratio = b.re / b.im;
+    const double denominator = b.im + b.re * ratio;
+    return {(a.re * ratio + a.im) / denominator, (a.im * ratio - a.re) / denominator};
+}
+
+inline double Conj(double a) { return a; }
+inline CDB Conj(CDB a) { return {a.re, -a.im}; }
+inline double RealPart(double a) { return a; }
+inline double RealPart(CDB a) { return a.re; }
+inline double ImagPart(double) { return 0.0; }
+inline double ImagPart(CDB a) { return a.im; }
+// |re| + |im|: as good as the modulus to tell large from small, and without a square root.
+inline double AbsSum(double a) { return std::fabs(a); }
+inline double AbsSum(CDB a) { return std::fabs(a.re) + std::fabs(a.im); }
+inline double SquaredModulus(double a) { return a * a; }
+inline double SquaredModulus(CDB a) { return a.re * a.re + a.im * a.im; }
+inline double Modulus(double a) { return std::fabs(a); }
+inline double Modulus(CDB a) { return std::hypot(a.re, a.im); }
+
+inline void Swap(CDB *a, CDB *b) {
+    const CDB held = *a;
+    *a = *b;
+    *b = held;
+}
+inline void Swap(I32 *a, I32 *b) {
+    const int32_t held = *a;
+    *a = *b;
+    *b = held;
+}
+
+// An element in a block, with the alignment that its typedef has.
+template <ElementType E>
+using ElementOf = typename Element<E>::type;
+
+// A local value of an element type: a template argument would drop the typedef's alignment, and a
+// local value needs none of it.
+template <ElementType E>
+struct ScalarOf;
+template <>
+struct ScalarOf<ElementType::DBL> {
+    typedef double type;
+    static type Of(double real) { return real; }
+};
+template <>
+struct ScalarOf<ElementType::CDB> {
+    typedef CDB type;
+    static type Of(double real) { return {real, 0.0}; }
+};
+
+// How many DBL an element is made of; real factors act on these alone.
+template <ElementType E>
+constexpr int32_t partsOf = E == ElementType::CDB ? 2 : 1;
+
+inline constexpr double epsilon = 0x1p-52;
+
+} // namespace qx
+
+#endif

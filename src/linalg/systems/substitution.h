@@ -1,0 +1,39 @@
+#ifndef QX_LINALG_SYSTEMS_SUBSTITUTION_H
+#define QX_LINALG_SYSTEMS_SUBSTITUTION_H
+
+#include "frame/widths.h"
+#include "qx/types.h"
+
+#include <cstdint>
+
+namespace qx {
+
+// What a triangular solve reads.
+enum class Factors {
+    lu,          // square, row after row: unit lower triangle, then the upper one
+    lowerPacked, // see Triangle (linalg/matrix.h)
+    upperPacked,
+    cholesky // the packed lower triangle, then its conjugate transpose
+};
+
+// Solves in place for all right sides, x being n by `rightSides`, row after row. The order of
+// arithmetic is that of a single right side:
+//   lu           a sum of products in ascending order, subtracted from the element, for each row
+//   packed ones  each unknown's multiple is subtracted from all later elements at once
+// No pivot is tested. ErrOutOfMemory, for more than one right side.
+ErrorCode Substitute(Factors factors, const DBL *a, int32_t n, int32_t rightSides, DBL *x);
+ErrorCode Substitute(Factors factors, const CDB *a, int32_t n, int32_t rightSides, CDB *x);
+
+// The same with memory for the strips of columns that pass through the substitution together: n
+// times `stripWidth` doubles, or none for a single right side.
+inline constexpr int32_t stripWidth = 32;
+QX_BY_WIDTH(void, SubstituteStrips,
+            (Factors factors, const DBL *a, std::ptrdiff_t n, std::ptrdiff_t rightSides, DBL *x,
+             DBL *strip))
+QX_BY_WIDTH(void, CxSubstituteStrips,
+            (Factors factors, const CDB *a, std::ptrdiff_t n, std::ptrdiff_t rightSides, CDB *x,
+             DBL *strip))
+
+} // namespace qx
+
+#endif

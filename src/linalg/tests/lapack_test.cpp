@@ -1,0 +1,138 @@
+#include "linalg/lapack.h"
+#include "linalg/matrix.h"
+#include "linalg/products/products.h"
+#include "tests/support/recipe.h"
+
+#include <gtest/gtest.h>
+
+#include <cmath>
+#include <complex>
+#include <limits>
+#include <thread>
+#include <vector>
+
+namespace {
+
+typedef std::complex<long double> Exact;
+
+std::vector<CDB> Elements(std::size_t count, uint64_t seed) {
+    qx::test::Noise noise(seed);
+    std::vector<CDB> x(count);
+    for (CDB &z : x)
+        z = {noise.symmetric(), noise.symmetric()};
+    return x;
+}
+std::vector<double> Reals(std::size_t count, uint64_t seed) {
+    qx::test::Noise noise(seed);
+    std::vector<double> x(count);
+    for (double &value : x)
+        value = noise.symmetric();
+    return x;
+}
+
+Exact Of(CDB z) { return {z.re, z.im}; }
+Exact Of(double x) { return {x, 0}; }
+
+// The largest difference from the definition, summed downward in long double, over the largest sum
+// of moduli.
+template <class T>
+double ErrorOfProduct(const std::vector<T> &a, const std::vector<T> &b, const std::vector<T> &c,
+                      int m, int k, int n) {
+    long double error = 0, scale = 0;
+    for (int i = 0; i < m; ++i)
+        for (int j = 0; j < n; ++j) {
+            Exact sum = 0;
+            long double moduli = 0;
+            for (int p = k - 1; p >= 0; --p) {
+                sum += Of(a[i * k + p]) * Of(b[p * n + j]);
+                moduli += std::abs(Of(a[i * k + p]) * Of(b[p * n + j]));
+            }
+            error = std::max(error, std::abs(sum - Of(c[i * n + j])));
+            scale = std::max(scale, moduli);
+        }
+    return static_cast<double>(error / scale);
+}
+
+const int shapes[][3] = {{1, 1, 1},    {2, 3, 4},    {8, 8, 8},     {9, 8, 8},
+                         {5, 1, 7},    {1, 40, 1},   {13, 17, 11},  {64, 64, 64},
+                         {3, 130, 70}, {130, 65, 3}, {1540, 300, 3}};
+
+TEST(Products, AgreeWithTheDefinitionInEveryShape) {
+    for (const auto &[m, k, n] : shapes) {
+        SCOPED_TRACE(testing::Message() << m << " " << k << " " << n);
+        for (const int alignedCopy : {0, 1}) {
+            const auto a = Reals(m * k, 1), b = Reals(k * n, 2);
+            std::vector<double> c(m * n, 7.0);
+            ASSERT_EQ(qx::MatrixProduct(a.data(), b.data(), m, k, n, c.data(), alignedCopy), 0);
+            EXPECT_LT(ErrorOfProduct(a, b, c, m, k, n), 4e-16);
+            const auto za = Elements(m * k, 1), zb = Elements(k * n, 2);
+            std::vector<CDB> zc(m * n, CDB{7.0, 7.0});
+            ASSERT_EQ(qx::MatrixProduct(za.data(), zb.data(), m, k, n, zc.data(), alignedCopy), 0);
+            EXPECT_LT(ErrorOfProduct(za, zb, zc, m, k, n), 8e-16);
+        }
+    }
+}
+
+TEST(Products, TransposesAndConjugates) {
+    const int m = 37, n = 21;
+    auto a = Elements(m * n, 1);
+    std::vector<CDB> t(m * n), product(m * m);
+    qx::TransposeMatrix(a.data(), m, n, t.data());
+    for (int i = 0; i < m; ++i)
+        for (int j = 0; j < n; ++j)
+            EXPECT_EQ(t[j * m + i].im, a[i * n + j].im);
+    ASSERT_EQ(qx::ProductWithConjugate(a.data(), a.data(), m, n, m, product.data()), 0);
+    for (CDB &z : t)
+        z = qx::Conj(z);
+    EXPECT_LT(ErrorOfProduct(a, t, product, m, n, m), 8e-16);
+    qx::TransposeMatrix(t.data(), n, m, nullptr); // in place
+    EXPECT_EQ(t[5 * n + 3].im, -a[5 * n + 3].im);
+}
+
+TEST(Products, OfSmallMatricesAreSummedInAscendingOrder) {
+    // 1e16 swallows a 1 that comes after it, but not one that comes after its own negative.
+    const double a[] = {1e16, 1, -1e16, 1};
+    const double ones[] = {1, 1, 1, 1};
+    double c;
+    qx::MatrixProductPlain(a, ones, 1, 4, 1, &c);
+    EXPECT_EQ(c, 1.0);
+    qx::MatrixVectorProduct(a, 1, 4, ones, &c);
+    EXPECT_EQ(c, 1.0);
+}
+
+TEST(Lapack, BandAndTridiagonalDriversSolve) {
+    // The complex band matrix of (i, 2, i) of order 4; x = 1.
+    const int n = 4;
+    CDB band[4 * 4], b[4];
+    for (int j = 0; j < n; ++j) {
+        band[4 * j + 1] = band[4 * j + 3] = {0.0, 1.0};
+        band[4 * j + 2] = {2.0, 0.0};
+        b[j] = {2.0, j == 0 || j == n - 1 ? 1.0 : 2.0};
+    }
+    int32_t pivots[4];
+    ASSERT_EQ(qx::lapack::SolveBand(n, 1, 1, 1, band, pivots, b), 0);
+    for (const CDB &x : b) {
+        EXPECT_NEAR(x.re, 1.0, 1e-15);
+        EXPECT_NEAR(x.im, 0.0, 1e-15);
+    }
+}
+
+TEST(Blas, ThreadsAtOnceGetTheBitsOfOneAlone) {
+    const int n = 150;
+    const auto a = Reals(n * n, 1), b = Reals(n * n, 2);
+    std::vector<double> expected(n * n);
+    qx::MatrixProductPlain(a.data(), b.data(), n, n, n, expected.data());
+    std::vector<std::vector<double>> results(8, std::vector<double>(n * n));
+    std::vector<std::thread> threads;
+    for (auto &c : results)
+        threads.emplace_back([&] {
+            for (int round = 0; round < 20; ++round)
+                qx::MatrixProductPlain(a.data(), b.data(), n, n, n, c.data());
+        });
+    for (std::thread &thread : threads)
+        thread.join();
+    for (const auto &c : results)
+        EXPECT_EQ(c, expected);
+}
+
+} // namespace
