@@ -204,8 +204,9 @@ class Catalogue(unittest.TestCase):
     def test_list_and_show(self):
         code, out, _ = run("list", "m*_head")
         self.assertEqual(code, 0)
-        self.assertEqual(re.findall(r"^  (M\w+_head)", out, re.MULTILINE),
-                         ["Mean_head", "MSE_head", "Moment_head", "Median_head"])
+        names = re.findall(r"^  (\w+)", out, re.MULTILINE)
+        self.assertLessEqual({"Mean_head", "MSE_head", "Moment_head", "Median_head"}, set(names))
+        self.assertTrue(all(re.fullmatch(r"[Mm]\w*_head", name) for name in names), names)
         code, out, _ = run("show", "Moment_head")
         self.assertEqual(code, 0)
         for part in ('moment = qx.call("Moment_head", x, order)', "-20021  ErrOrderNotPositive", "qx/stats.h"):

@@ -1,6 +1,7 @@
 #ifndef QX_FRAME_PLATFORM_H
 #define QX_FRAME_PLATFORM_H
 
+#include <cstddef>
 #include <cstdint>
 
 namespace qx::platform {
@@ -42,6 +43,11 @@ void *LoadedModule(const char *name);
 void *ModuleSymbol(void *module, const char *name);
 // File names of the host's run-time, in the order in which they are looked for.
 extern const char *const hostModuleNames[2];
+
+// Memory by the page, not from the heap: zeros, taken from the system as they are touched. Null
+// where there is none.
+void *MapPages(std::size_t bytes);
+void UnmapPages(void *pages, std::size_t bytes);
 
 // Shows the message to the user and ends the process with code 1.
 [[noreturn]] void FatalExit(const char *caption, const char *text);

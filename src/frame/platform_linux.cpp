@@ -4,6 +4,7 @@
 #include <link.h>
 #include <pthread.h>
 #include <sched.h>
+#include <sys/mman.h>
 #include <sys/uio.h>
 #include <unistd.h>
 
@@ -43,6 +44,13 @@ void CriticalSectionLeave(void *section) { pthread_mutex_unlock(AsMutex(section)
 uintptr_t CurrentThread() { return static_cast<uintptr_t>(pthread_self()); }
 
 void Yield() { sched_yield(); }
+
+void *MapPages(std::size_t bytes) {
+    void *const pages = mmap(nullptr, bytes, PROT_READ | PROT_WRITE,
+                             MAP_PRIVATE | MAP_ANONYMOUS | MAP_NORESERVE, -1, 0);
+    return pages == MAP_FAILED ? nullptr : pages;
+}
+void UnmapPages(void *pages, std::size_t bytes) { munmap(pages, bytes); }
 
 void *MainModule() { return dlopen(nullptr, RTLD_NOW | RTLD_NOLOAD); }
 

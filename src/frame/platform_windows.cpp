@@ -31,6 +31,11 @@ uintptr_t CurrentThread() { return GetCurrentThreadId(); }
 
 void Yield() { Sleep(0); }
 
+void *MapPages(std::size_t bytes) {
+    return VirtualAlloc(nullptr, bytes, MEM_RESERVE | MEM_COMMIT, PAGE_READWRITE);
+}
+void UnmapPages(void *pages, std::size_t) { VirtualFree(pages, 0, MEM_RELEASE); }
+
 void *MainModule() { return GetModuleHandleA(nullptr); }
 
 void *LoadedModule(const char *name) { return GetModuleHandleA(name); }

@@ -1,5 +1,7 @@
 #include "linalg/lapack.h"
 
+#include "linalg/blas_memory.h"
+
 // LAPACK's complex elements are ours.
 #define lapack_complex_float CSG
 #define lapack_complex_double CDB
@@ -10,27 +12,36 @@ namespace qx {
 
 namespace blas {
 
-void Product(int32_t m, int32_t n, int32_t k, const DBL *a, const DBL *b, DBL *c) {
+ErrorCode Product(int32_t m, int32_t n, int32_t k, const DBL *a, const DBL *b, DBL *c) {
+    const BlasMemory memory;
+    if (!memory)
+        return ErrOutOfMemory;
     cblas_dgemm(CblasRowMajor, CblasNoTrans, CblasNoTrans, m, n, k, 1.0, a, k, b, n, 0.0, c, n);
+    return 0;
 }
 
 namespace {
 
-void ComplexProduct(CBLAS_TRANSPOSE transposition, int32_t m, int32_t n, int32_t k, const CDB *a,
-                    const CDB *b, int32_t bCols, CDB *c) {
+ErrorCode ComplexProduct(CBLAS_TRANSPOSE transposition, int32_t m, int32_t n, int32_t k,
+                         const CDB *a, const CDB *b, int32_t bCols, CDB *c) {
+    const BlasMemory memory;
+    if (!memory)
+        return ErrOutOfMemory;
     const CDB one = {1.0, 0.0}, zero = {0.0, 0.0};
     cblas_zgemm(CblasRowMajor, CblasNoTrans, transposition, m, n, k, &one, a, k, b, bCols, &zero, c,
                 n);
+    return 0;
 }
 
 } // namespace
 
-void Product(int32_t m, int32_t n, int32_t k, const CDB *a, const CDB *b, CDB *c) {
-    ComplexProduct(CblasNoTrans, m, n, k, a, b, n, c);
+ErrorCode Product(int32_t m, int32_t n, int32_t k, const CDB *a, const CDB *b, CDB *c) {
+    return ComplexProduct(CblasNoTrans, m, n, k, a, b, n, c);
 }
 
-void ProductWithConjugate(int32_t m, int32_t n, int32_t k, const CDB *a, const CDB *b, CDB *c) {
-    ComplexProduct(CblasConjTrans, m, n, k, a, b, k, c);
+ErrorCode ProductWithConjugate(int32_t m, int32_t n, int32_t k, const CDB *a, const CDB *b,
+                               CDB *c) {
+    return ComplexProduct(CblasConjTrans, m, n, k, a, b, k, c);
 }
 
 } // namespace blas
@@ -39,6 +50,9 @@ namespace lapack {
 
 int32_t SolveBand(int32_t n, int32_t lower, int32_t upper, int32_t rightSides, DBL *band,
                   int32_t *pivots, DBL *b) {
+    const BlasMemory memory;
+    if (!memory)
+        return noMemory;
     const int32_t leading = 2 * lower + upper + 1;
     int32_t info = 0;
     LAPACK_dgbsv(&n, &lower, &upper, &rightSides, band, &leading, pivots, b, &n, &info);
@@ -47,6 +61,9 @@ int32_t SolveBand(int32_t n, int32_t lower, int32_t upper, int32_t rightSides, D
 
 int32_t SolveBand(int32_t n, int32_t lower, int32_t upper, int32_t rightSides, CDB *band,
                   int32_t *pivots, CDB *b) {
+    const BlasMemory memory;
+    if (!memory)
+        return noMemory;
     const int32_t leading = 2 * lower + upper + 1;
     int32_t info = 0;
     LAPACK_zgbsv(&n, &lower, &upper, &rightSides, band, &leading, pivots, b, &n, &info);

@@ -1,6 +1,7 @@
 #ifndef QX_LINALG_LAPACK_H
 #define QX_LINALG_LAPACK_H
 
+#include "qx/errors.h"
 #include "qx/types.h"
 
 #include <cstdint>
@@ -13,18 +14,23 @@ namespace qx {
 
 namespace blas {
 
+// Each returns 0 or ErrOutOfMemory.
+
 // c = a b, all row after row: a is m by k, b k by n. The sizes are positive.
-void Product(int32_t m, int32_t n, int32_t k, const DBL *a, const DBL *b, DBL *c);
-void Product(int32_t m, int32_t n, int32_t k, const CDB *a, const CDB *b, CDB *c);
+ErrorCode Product(int32_t m, int32_t n, int32_t k, const DBL *a, const DBL *b, DBL *c);
+ErrorCode Product(int32_t m, int32_t n, int32_t k, const CDB *a, const CDB *b, CDB *c);
 
 // c = a b^H, all row after row: a is m by k, b n by k.
-void ProductWithConjugate(int32_t m, int32_t n, int32_t k, const CDB *a, const CDB *b, CDB *c);
+ErrorCode ProductWithConjugate(int32_t m, int32_t n, int32_t k, const CDB *a, const CDB *b, CDB *c);
 
 } // namespace blas
 
 namespace lapack {
 
-// Each returns LAPACK's info: 0, or what the driver's documentation says.
+// Each returns LAPACK's info: 0, or what the driver's documentation says, or noMemory.
+constexpr int32_t noMemory = -1000;
+// The code of a negative info.
+inline ErrorCode CodeOf(int32_t info) { return info == noMemory ? ErrOutOfMemory : ErrInternal; }
 
 // Solves with a band matrix; `band` has 2 lower + upper + 1 rows per column.
 int32_t SolveBand(int32_t n, int32_t lower, int32_t upper, int32_t rightSides, DBL *band,

@@ -21,18 +21,21 @@ constexpr int64_t smallProduct = 8 * 8 * 8;
 constexpr int32_t band = 1530;
 
 template <ElementType E>
-void Multiply(const typename Element<E>::type *a, const typename Element<E>::type *b, int32_t m,
-              int32_t k, int32_t n, typename Element<E>::type *c) {
+ErrorCode Multiply(const typename Element<E>::type *a, const typename Element<E>::type *b,
+                   int32_t m, int32_t k, int32_t n, typename Element<E>::type *c) {
     if (int64_t{m} * n * k <= smallProduct) {
         OrderedProduct(a, b, m, k, n, c);
-        return;
+        return 0;
     }
     const bool inBands = E == ElementType::DBL && m > band && k > 256 && n > 2;
     const int32_t step = inBands ? band : m;
     for (int32_t i = 0; i < m; i += step) {
         const int32_t rows = m - i < step ? m - i : step;
-        blas::Product(rows, n, k, a + std::ptrdiff_t{i} * k, b, c + std::ptrdiff_t{i} * n);
+        if (const ErrorCode failed =
+                blas::Product(rows, n, k, a + std::ptrdiff_t{i} * k, b, c + std::ptrdiff_t{i} * n))
+            return failed;
     }
+    return 0;
 }
 
 template <ElementType E>
@@ -46,7 +49,8 @@ ErrorCode MultiplyCopies(const typename Element<E>::type *a, const typename Elem
             return failed;
     std::memcpy(aCopy.data(), a, static_cast<std::size_t>(aSize) * sizeof *a);
     std::memcpy(bCopy.data(), b, static_cast<std::size_t>(bSize) * sizeof *b);
-    Multiply<E>(aCopy.data(), bCopy.data(), m, k, n, cCopy.data());
+    if (const ErrorCode failed = Multiply<E>(aCopy.data(), bCopy.data(), m, k, n, cCopy.data()))
+        return failed;
     std::memcpy(c, cCopy.data(), static_cast<std::size_t>(cSize) * sizeof *c);
     return 0;
 }
@@ -65,8 +69,7 @@ ErrorCode Product(const typename Element<E>::type *a, const typename Element<E>:
     }
     if (alignedCopy != 0)
         return MultiplyCopies<E>(a, b, m, k, n, c);
-    Multiply<E>(a, b, m, k, n, c);
-    return 0;
+    return Multiply<E>(a, b, m, k, n, c);
 }
 
 // Four rows at a time: four sums that do not wait for each other.
@@ -121,9 +124,7 @@ ErrorCode ProductWithConjugate(const CDB *a, const CDB *b, int32_t m, int32_t k,
                                CDB *c) {
     if (m < 0 || k < 1 || n < 0)
         return ErrNegativeDimension;
-    if (m > 0 && n > 0)
-        blas::ProductWithConjugate(m, n, k, a, b, c);
-    return 0;
+    return m > 0 && n > 0 ? blas::ProductWithConjugate(m, n, k, a, b, c) : 0;
 }
 
 ErrorCode MatrixVectorProduct(const DBL *a, int32_t m, int32_t n, const DBL *x, DBL *y) {

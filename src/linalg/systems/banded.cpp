@@ -43,7 +43,7 @@ ErrorCode Solve(const typename Element<E>::type *band, int32_t n, int32_t lower,
     const int32_t info =
         lapack::SolveBand(n, lower, upper, rightSides, storage.data(), pivots.data(), b);
     if (info != 0)
-        return info > 0 ? ErrSingularMatrix : ErrInternal;
+        return info > 0 ? ErrSingularMatrix : lapack::CodeOf(info);
     return TransposeMatrix(b, rightSides, n, nullptr);
 }
 
