@@ -3,8 +3,8 @@
 
 /* The chirp-Z transform: the z-transform of a sequence on a spiral that starts at `a` and goes on
    by the step 1/w. With a of 1 and w of exp(-2 pi i / n) it is the discrete Fourier transform; a
-   short arc is a closer look at a part of the spectrum. L. Rabiner, R. Schafer and C. Rader
-   described it in 1969. */
+   short arc is a closer look at a part of the spectrum. Rabiner, Schafer and Rader, "The chirp
+   z-transform algorithm and its application"; the fast method is Bluestein's. */
 
 #include "qx/types.h"
 

@@ -20,7 +20,7 @@ CDB Product(const CDB &a, const CDB &b) {
 CDB Product(double a, const CDB &b) { return {a * b.re, a * b.im}; }
 CDB Sum(const CDB &a, const CDB &b) { return {a.re + b.re, a.im + b.im}; }
 
-// R. L. Smith's division: it divides by the larger part first, so that no square overflows.
+// Divides by the larger part first, so that no square overflows.
 CDB Quotient(const CDB &a, const CDB &b) {
     if (std::fabs(b.re) >= std::fabs(b.im)) {
         const double ratio = b.im / b.re;
