@@ -13,6 +13,7 @@
 #include "qx/fft.h"
 #include "qx/filtering.h"
 #include "qx/frame.h"
+#include "qx/matrix_factorisations.h"
 #include "qx/matrix_products.h"
 #include "qx/polyphase.h"
 #include "qx/rational_resampling.h"

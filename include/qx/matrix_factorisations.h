@@ -1,0 +1,187 @@
+#ifndef QX_MATRIX_FACTORISATIONS_H
+#define QX_MATRIX_FACTORISATIONS_H
+
+/* Factorisations of matrices: LU, Cholesky, QR, singular values, Schur and Hessenberg forms,
+   balancing, and inverses from factors.
+
+   Matrices stand row after row. Exports with an `err` have the function result 0; the others return
+   their code. Every failure empties all outputs. */
+
+#include "qx/types.h"
+
+QX_BEGIN_DECLS
+
+/** P a = L U in place of the m by n matrix a, by Crout's method with the largest pivot of each
+    column: L, with a unit diagonal that is not stored, below the diagonal, and U on and above it.
+    pivots, of m elements, are row numbers: in step k row k was exchanged with row pivots[k].
+    *parity is 1 for an odd number of exchanges, else 0. A singular matrix keeps its factors.
+    Codes: ErrEmptyInput (a is empty), ErrOutOfMemory (no memory), WarnSingular (U has a zero on its
+    diagonal). */
+QX_API int32_t LU_head(QX_INOUT DBL2D a, QX_OUT I32_1D pivots, QX_OUT int32_t *parity,
+                       QX_OUT ErrorCode *err);
+/** As LU_head, for complex elements. */
+QX_API int32_t CxLU_head(QX_INOUT CDB2D a, QX_OUT I32_1D pivots, QX_OUT int32_t *parity,
+                         QX_OUT ErrorCode *err);
+
+/** Cholesky factor L of the symmetric positive definite a = L L^T, in place of its lower triangle
+    in packed storage: column after column, column j with rows j to n-1. Near singularity counts as
+    failure, too: a diagonal element of L below 1.5e-8 of the largest element of L.
+    Codes: ErrEmptyInput (packed is empty), ErrNotSquare (the length is no n(n+1)/2),
+    ErrNotPositiveDefinite (a is not positive definite, or nearly singular). */
+QX_API int32_t Cholesky_head(QX_INOUT DBL1D packed, QX_OUT ErrorCode *err);
+/** As Cholesky_head, for a Hermitian a = L L^H, of whose diagonal the real parts count. */
+QX_API int32_t CxCholesky_head(QX_INOUT CDB1D packed, QX_OUT ErrorCode *err);
+
+/** The factor of Cholesky_head in place of a square matrix: read from the lower triangle, and
+    written there with zeros above.
+    Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrOutOfMemory (no memory),
+    ErrNotPositiveDefinite (a is not positive definite, or nearly singular). */
+QX_API int32_t FullCholesky_head(QX_INOUT DBL2D a, QX_OUT ErrorCode *err);
+/** As FullCholesky_head, for a Hermitian matrix. */
+QX_API int32_t CxFullCholesky_head(QX_INOUT CDB2D a, QX_OUT ErrorCode *err);
+
+/** The inverse of L L^T, as a packed lower triangle in place of the factor of Cholesky_head.
+    Codes: ErrEmptyInput (packedFactor is empty), ErrNotSquare (the length is no n(n+1)/2),
+    ErrSingularMatrix (a diagonal element is 0). */
+QX_API int32_t Cholesky_InvMatrix_head(QX_INOUT DBL1D packedFactor, QX_OUT ErrorCode *err);
+/** As Cholesky_InvMatrix_head, for L L^H. */
+QX_API int32_t CxCholesky_InvMatrix_head(QX_INOUT CDB1D packedFactor, QX_OUT ErrorCode *err);
+
+/** The inverse of a symmetric positive definite matrix in its place. Only the lower triangle is
+    read; both are written.
+    Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrOutOfMemory (no memory),
+    ErrNotPositiveDefinite (a is not positive definite, or nearly singular). */
+QX_API int32_t InvMatrixChoDri_head(QX_INOUT DBL2D a, QX_OUT ErrorCode *err);
+/** As InvMatrixChoDri_head, for a Hermitian matrix. */
+QX_API int32_t CxInvMatrixChoDri_head(QX_INOUT CDB2D a, QX_OUT ErrorCode *err);
+
+/** As InvMatrixChoDri_head, without a request for memory: packedWork, of at least n(n+1)/2 elements,
+    is the work space. It is neither resized nor emptied.
+    Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrSizeMismatch (packedWork is
+    too short), ErrNotPositiveDefinite (a is not positive definite, or nearly singular). */
+QX_API int32_t PreallocInvMatrixChoDri_H(QX_INOUT DBL2D a, QX_INOUT DBL1D packedWork,
+                                         QX_OUT ErrorCode *err);
+
+/* A triangle in packed storage, column after column: `triangle` 0 lower, column j with rows j to
+   n-1; 1 upper, column j with rows 0 to j. */
+typedef struct PackedTriangle {
+    DBL1D packed;
+    int32_t triangle;
+} PackedTriangle;
+typedef struct CxPackedTriangle {
+    CDB1D packed;
+    int32_t triangle;
+} CxPackedTriangle;
+
+/** The inverse of a packed triangle, in its place.
+    Codes: ErrEmptyInput (packed is empty), ErrNotSquare (the length is no n(n+1)/2),
+    ErrInvalidSelector (triangle is not 0 or 1), ErrNonFiniteInput (an element is not finite),
+    ErrSingularMatrix (a diagonal element is at most 2.2e-16 of the largest element in absolute
+    value). */
+QX_API int32_t Tri_InvMatrix_head(QX_INOUT PackedTriangle *a, QX_OUT ErrorCode *err);
+/** As Tri_InvMatrix_head, for complex elements. */
+QX_API int32_t CxTri_InvMatrix_head(QX_INOUT CxPackedTriangle *a, QX_OUT ErrorCode *err);
+
+/** The inverse of a triangular matrix, in its place: of the lower triangle for *triangle 0, of the
+    upper one for 1. The other triangle is not read; it becomes 0.
+    Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrInvalidSelector (*triangle
+    is not 0 or 1), ErrOutOfMemory (no memory), ErrNonFiniteInput (an element is not finite),
+    ErrSingularMatrix (a diagonal element is at most 2.2e-16 of the largest element in absolute
+    value). */
+QX_API int32_t InvMatrixTriDri_head(QX_INOUT DBL2D a, QX_IN const int32_t *triangle,
+                                    QX_OUT ErrorCode *err);
+/** As InvMatrixTriDri_head, for complex elements. */
+QX_API int32_t CxInvMatrixTriDri_head(QX_INOUT CDB2D a, QX_IN const int32_t *triangle,
+                                      QX_OUT ErrorCode *err);
+
+/** a = q r with q of m by m unitary and r of m by n upper triangular, for a of m by n. *algorithm 0:
+    Householder reflections; the diagonal of r has either sign. 1 and 2: Gram-Schmidt
+    orthogonalisation, modified and classical, each projection made twice; the diagonal of r is not
+    negative, and 0 for a column that depends on those before it within m eps, where q goes on with
+    another vector orthogonal to them. All three leave q unitary and a - q r small to a few m eps,
+    however ill-conditioned a is. L. Giraud, J. Langou, M. Rozloznik, "On the loss of orthogonality in
+    the Gram-Schmidt orthogonalization process", 2005.
+    Codes: ErrEmptyInput (a is empty), ErrInvalidSelector (*algorithm is not 0, 1 or 2),
+    ErrOutOfMemory (no memory), ErrNonFiniteInput (an element is not finite). */
+QX_API int32_t qrd_head(QX_IN DBL2D a, QX_IN const int32_t *algorithm, QX_OUT DBL2D q,
+                        QX_OUT DBL2D r, QX_OUT ErrorCode *err);
+/** As qrd_head, for complex elements; the diagonal of r is real. */
+QX_API int32_t Cxqrd_head(QX_IN CDB2D a, QX_IN const int32_t *algorithm, QX_OUT CDB2D q,
+                          QX_OUT CDB2D r, QX_OUT ErrorCode *err);
+
+/** QR factors by Householder reflections of the m by n matrix a, k = min(m, n). economy 0: q of m by
+    m and r of m by n; 1: q of m by k and r of k by n; 2: r of k by n only, and q is empty. With
+    pivoting 0 a = q r, and permutation is empty. Otherwise a permutation = q r, where permutation is
+    n by n with a single 1 in each row and column, and each step takes the longest remaining column, so
+    that the diagonal of r falls in absolute value (P. Businger and G. H. Golub, 1965).
+    Codes: ErrEmptyInput (a is empty), ErrInvalidSelector (economy is not 0, 1 or 2), ErrOutOfMemory
+    (no memory), ErrNonFiniteInput (an element is not finite). */
+QX_API ErrorCode QRDecH(QX_IN DBL2D a, int32_t pivoting, int32_t economy, QX_OUT I32_2D permutation,
+                        QX_OUT DBL2D q, QX_OUT DBL2D r);
+/** As QRDecH, for complex elements; the diagonal of r is real. */
+QX_API ErrorCode CxQRDecH(QX_IN CDB2D a, int32_t pivoting, int32_t economy,
+                          QX_OUT I32_2D permutation, QX_OUT CDB2D q, QX_OUT CDB2D r);
+
+/** Singular value decomposition a = u diag(s) v^T of the m by n matrix a, k = min(m, n): a becomes u
+    of m by k, s has k falling values, and v is n by k. G. H. Golub and C. Reinsch, "Singular value
+    decomposition and least squares solutions", 1970. The error of a value is a few n eps times the
+    largest one, but never less than about 2.2e-16: what is below that counts as zero, so a matrix
+    whose norm is far below 1 should be scaled up first.
+    Codes: ErrEmptyInput (a is empty), ErrOutOfMemory (no memory), ErrNonFiniteInput (an element is
+    not finite), ErrIterationLimit (100 iterations were not enough for a value). */
+QX_API int32_t SVD_head(QX_INOUT DBL2D a, QX_OUT DBL1D s, QX_OUT DBL2D v, QX_OUT ErrorCode *err);
+/** As SVD_head, for complex elements: a = u diag(s) v^H. */
+QX_API int32_t CxSVD_head(QX_INOUT CDB2D a, QX_OUT DBL1D s, QX_OUT CDB2D v, QX_OUT ErrorCode *err);
+
+/** As SVD_head, but u is an output of its own and the code is the function result; with fullSize
+    other than 0 u is m by m and v is n by n. */
+QX_API ErrorCode SVDEx_head(QX_IN DBL2D a, int32_t fullSize, QX_OUT DBL2D u, QX_OUT DBL1D s,
+                            QX_OUT DBL2D v);
+/** As SVDEx_head, for complex elements: a = u diag(s) v^H. */
+QX_API ErrorCode CxSVDEx_head(QX_IN CDB2D a, int32_t fullSize, QX_OUT CDB2D u, QX_OUT DBL1D s,
+                              QX_OUT CDB2D v);
+
+/** As SVD_head, the values alone: the same to the bit as with the vectors. */
+QX_API int32_t SVDS_head(QX_IN DBL2D a, QX_OUT DBL1D s, QX_OUT ErrorCode *err);
+/** As SVDS_head, for complex elements. */
+QX_API int32_t CxSVDS_head(QX_IN CDB2D a, QX_OUT DBL1D s, QX_OUT ErrorCode *err);
+
+/** Hessenberg form h = q^T a q of the square matrix a, in its place, by Householder reflections: zero
+    below the first subdiagonal. Rows and columns low to high, counted from 1 as MatrixBalance_head
+    gives them, are reduced; a must be upper triangular outside of them.
+    Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrIndexOutOfRange (not 1 <= low
+    <= high <= n), ErrOutOfMemory (no memory), ErrNonFiniteInput (an element is not finite). */
+QX_API ErrorCode Hessenberg_head(QX_INOUT DBL2D a, int32_t low, int32_t high, QX_OUT DBL2D q);
+/** As Hessenberg_head, for complex elements: h = q^H a q. */
+QX_API ErrorCode CxHessenberg_head(QX_INOUT CDB2D a, int32_t low, int32_t high, QX_OUT CDB2D q);
+
+/** Balances the square matrix a in its place. job 0 does nothing; 1 permutes rows and columns so that
+    eigenvalues are isolated in the corners; 2 multiplies rows and columns by powers of two so that
+    their sums of absolute values become alike; 3 does both. Rows and columns *low to *high, counted
+    from 1, are the block between the corners. scale[i] is the factor of row and column i of the block;
+    outside it is the number, from 1, of the row with which row i was exchanged, the last ones first,
+    from n down to high + 1, then those from 1 to low - 1. B. N. Parlett and C. Reinsch, "Balancing a
+    matrix for calculation of eigenvalues and eigenvectors", 1969.
+    Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrInvalidSelector (job is not 0
+    to 3), ErrOutOfMemory (no memory), ErrNonFiniteInput (an element is not finite). */
+QX_API ErrorCode MatrixBalance_head(QX_INOUT DBL2D a, int32_t job, QX_OUT int32_t *low,
+                                    QX_OUT int32_t *high, QX_OUT DBL1D scale);
+/** As MatrixBalance_head, for complex elements, whose size is taken as |re| + |im|. */
+QX_API ErrorCode CxMatrixBalance_head(QX_INOUT CDB2D a, int32_t job, QX_OUT int32_t *low,
+                                      QX_OUT int32_t *high, QX_OUT DBL1D scale);
+
+/** Turns eigenvectors of a matrix that MatrixBalance_head has balanced, the columns of v, into those
+    of the original matrix; job, low, high and scale are those of that call. side 0: right
+    eigenvectors; 1: left ones. The vectors are not scaled to unit length.
+    Codes: ErrEmptyInput (v or scale is empty), ErrInvalidSelector (job is not 0 to 3, or side not 0 or
+    1), ErrSizeMismatch (scale has another length than v has rows), ErrIndexOutOfRange (not 1 <= low <=
+    high <= n, or an exchange is with no row of v), ErrOutOfMemory (no memory). */
+QX_API ErrorCode EigenVBack_head(int32_t job, int32_t side, int32_t low, int32_t high,
+                                 QX_IN DBL1D scale, QX_INOUT DBL2D v);
+/** As EigenVBack_head, for complex vectors. */
+QX_API ErrorCode CxEigenVBack_head(int32_t job, int32_t side, int32_t low, int32_t high,
+                                   QX_IN DBL1D scale, QX_INOUT CDB2D v);
+
+QX_END_DECLS
+
+#endif

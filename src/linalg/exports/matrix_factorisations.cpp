@@ -1,0 +1,426 @@
+#include "qx/matrix_factorisations.h"
+
+#include "frame/export.h"
+#include "linalg/factorisations/balance.h"
+#include "linalg/factorisations/cholesky.h"
+#include "linalg/factorisations/hessenberg.h"
+#include "linalg/factorisations/qr.h"
+#include "linalg/factorisations/svd.h"
+#include "linalg/matrix.h"
+#include "linalg/systems/lu.h"
+
+#include <algorithm>
+
+namespace qx {
+namespace {
+
+template <class Handle>
+constexpr ElementType elementOf = HandleTraits<Handle>::code;
+
+// kept: of all exports here that have an `err`, the last failed check decides
+
+template <class Matrix>
+ErrorCode CheckSquare(const Block<Matrix> &a) {
+    return LastFailed({{a.isEmpty(), ErrEmptyInput}, {!a.isSquare(), ErrNotSquare}});
+}
+template <class Vector>
+ErrorCode CheckPacked(const Block<Vector> &packed) {
+    return LastFailed({{packed.isEmpty(), ErrEmptyInput},
+                       {!packed.isEmpty() && OrderOfPacked(packed.size()) < 0, ErrNotSquare}});
+}
+
+template <class Matrix>
+Outcome LU(InOut<Matrix> a, Out<I32_1D> pivots, OutI32 parity) {
+    if (a.isEmpty())
+        return ErrEmptyInput;
+    if (const Outcome bad = pivots.resize(a.rows()))
+        return bad;
+    return LUDecompose(a.data(), a.rows(), a.cols(), pivots.data(), parity.address());
+}
+
+template <class Vector>
+Outcome Cholesky(InOut<Vector> packed) {
+    if (const ErrorCode bad = CheckPacked(packed))
+        return bad;
+    return PackedCholesky(packed.data(), OrderOfPacked(packed.size()));
+}
+
+// The square matrix of a packed Hermitian one.
+template <ElementType E>
+void ExpandHermitian(const ElementOf<E> *packed, int32_t n, ElementOf<E> *a) {
+    ExpandPacked(packed, n, lowerTriangle, a);
+    for (int32_t i = 0; i < n; ++i)
+        for (int32_t j = i + 1; j < n; ++j)
+            a[i * n + j] = Conj(a[j * n + i]);
+}
+
+template <class Matrix>
+Outcome FullCholesky(InOut<Matrix> a) {
+    if (const ErrorCode bad = CheckSquare(a))
+        return bad;
+    Scratch<elementOf<Matrix>> packed;
+    if (const ErrorCode bad = packed.allocate(PackedLength(a.rows())))
+        return bad;
+    PackMatrix(a.data(), a.rows(), lowerTriangle, packed.data());
+    const ErrorCode status = PackedCholesky(packed.data(), a.rows());
+    ExpandPacked(packed.data(), a.rows(), lowerTriangle, a.data());
+    return status;
+}
+
+template <class Vector>
+Outcome InverseFromFactor(InOut<Vector> packed) {
+    if (const ErrorCode bad = CheckPacked(packed))
+        return bad;
+    return InvertFromCholesky(packed.data(), OrderOfPacked(packed.size()));
+}
+
+template <ElementType E>
+ErrorCode InvertPositiveDefinite(ElementOf<E> *a, int32_t n, ElementOf<E> *packed) {
+    PackMatrix(a, n, symmetric, packed);
+    if (const ErrorCode failed = PackedCholesky(packed, n))
+        return failed;
+    if (const ErrorCode failed = InvertFromCholesky(packed, n))
+        return failed;
+    ExpandHermitian<E>(packed, n, a);
+    return 0;
+}
+
+template <class Matrix>
+Outcome InversePositiveDefinite(InOut<Matrix> a) {
+    if (const ErrorCode bad = CheckSquare(a))
+        return bad;
+    Scratch<elementOf<Matrix>> packed;
+    if (const ErrorCode bad = packed.allocate(PackedLength(a.rows())))
+        return bad;
+    return InvertPositiveDefinite<elementOf<Matrix>>(a.data(), a.rows(), packed.data());
+}
+
+Outcome InversePreallocated(InOut<DBL2D> a, InOut<DBL1D, OnFailure::Keep> work) {
+    if (const ErrorCode bad = LastFailed({{a.isEmpty(), ErrEmptyInput},
+                                          {!a.isSquare(), ErrNotSquare},
+                                          {work.size() < PackedLength(a.rows()), ErrSizeMismatch}}))
+        return bad;
+    return InvertPositiveDefinite<ElementType::DBL>(a.data(), a.rows(), work.data());
+}
+
+bool IsNoTriangle(int32_t triangle) {
+    return triangle != lowerTriangle && triangle != upperTriangle;
+}
+
+template <class Vector>
+Outcome InversePackedTriangle(InOut<Vector> packed, int32_t triangle) {
+    if (const ErrorCode bad =
+            LastFailed({{packed.isEmpty(), ErrEmptyInput},
+                        {!packed.isEmpty() && OrderOfPacked(packed.size()) < 0, ErrNotSquare},
+                        {IsNoTriangle(triangle), ErrInvalidSelector}}))
+        return bad;
+    return InvertTriangle(packed.data(), OrderOfPacked(packed.size()), triangle);
+}
+
+template <class Matrix>
+Outcome InverseTriangle(InOut<Matrix> a, int32_t triangle) {
+    if (const ErrorCode bad = LastFailed({{a.isEmpty(), ErrEmptyInput},
+                                          {!a.isSquare(), ErrNotSquare},
+                                          {IsNoTriangle(triangle), ErrInvalidSelector}}))
+        return bad;
+    Scratch<elementOf<Matrix>> packed;
+    if (const ErrorCode bad = packed.allocate(PackedLength(a.rows())))
+        return bad;
+    PackMatrix(a.data(), a.rows(), triangle, packed.data());
+    if (const ErrorCode failed = InvertTriangle(packed.data(), a.rows(), triangle))
+        return failed;
+    ExpandPacked(packed.data(), a.rows(), triangle, a.data());
+    return 0;
+}
+
+template <class Matrix>
+Outcome QRByAlgorithm(In<Matrix> a, int32_t algorithm, Out<Matrix> q, Out<Matrix> r) {
+    if (const ErrorCode bad = LastFailed(
+            {{a.isEmpty(), ErrEmptyInput}, {algorithm < 0 || algorithm > 2, ErrInvalidSelector}}))
+        return bad;
+    const int32_t m = a.rows(), n = a.cols();
+    if (const Outcome bad = q.resize(m, m))
+        return bad;
+    if (const Outcome bad = r.resize(m, n))
+        return bad;
+    if (algorithm == 0)
+        return QRDecompose(a.data(), m, n, qrFull, q.data(), r.data());
+    return QRByGramSchmidt(a.data(), m, n,
+                           algorithm == 1 ? GramSchmidt::Modified : GramSchmidt::Classical,
+                           q.data(), r.data());
+}
+
+// permutation[pivots[j]][j] = 1
+void WritePermutation(const I32 *pivots, int32_t n, I32 *permutation) {
+    for (int32_t i = 0; i < n; ++i)
+        for (int32_t j = 0; j < n; ++j)
+            permutation[i * n + j] = pivots[j] == i;
+}
+
+template <class Matrix>
+Outcome QR(In<Matrix> a, bool pivoting, int32_t form, Out<I32_2D> permutation, Out<Matrix> q,
+           Out<Matrix> r) {
+    if (const ErrorCode bad = FirstFailed(
+            {{a.isEmpty(), ErrEmptyInput}, {form < qrFull || form > qrOnlyR, ErrInvalidSelector}}))
+        return bad;
+    const int32_t m = a.rows(), n = a.cols();
+    const int32_t size = form == qrFull ? m : std::min(m, n);
+    if (const Outcome bad = pivoting ? permutation.resize(n, n) : permutation.resize(0, 0))
+        return bad;
+    if (const Outcome bad = form == qrOnlyR ? q.resize(0, 0) : q.resize(m, size))
+        return bad;
+    if (const Outcome bad = r.resize(size, n))
+        return bad;
+    if (!pivoting)
+        return QRDecompose(a.data(), m, n, form, q.data(), r.data());
+    Scratch<ElementType::I32> pivots;
+    if (const ErrorCode failed = pivots.allocate(n))
+        return failed;
+    if (const ErrorCode failed =
+            QRDecomposePivoted(a.data(), m, n, form, pivots.data(), q.data(), r.data()))
+        return failed;
+    WritePermutation(pivots.data(), n, permutation.data());
+    return 0;
+}
+
+template <class Matrix>
+Outcome SVDInPlace(InOut<Matrix> a, Out<DBL1D> s, Out<Matrix> v) {
+    if (const Outcome bad = v.resize(0, 0)) // kept: both are emptied before anything else
+        return bad;
+    if (const Outcome bad = s.resize(0))
+        return bad;
+    if (a.isEmpty())
+        return ErrEmptyInput;
+    const int32_t m = a.rows(), n = a.cols(), k = std::min(m, n);
+    const int64_t count = int64_t{m} * n;
+    Scratch<elementOf<Matrix>> copy;
+    if (const ErrorCode failed = copy.allocate(count))
+        return failed;
+    for (int64_t i = 0; i < count; ++i)
+        copy[i] = a.data()[i];
+    if (const Outcome bad = a.resize(m, k))
+        return bad;
+    if (const Outcome bad = s.resize(k))
+        return bad;
+    if (const Outcome bad = v.resize(n, k))
+        return bad;
+    return SVDecompose(copy.data(), m, n, a.data(), s.data(), v.data(), 0);
+}
+
+template <class Matrix>
+Outcome SVD(In<Matrix> a, bool full, Out<Matrix> u, Out<DBL1D> s, Out<Matrix> v) {
+    if (a.isEmpty())
+        return ErrEmptyInput;
+    const int32_t m = a.rows(), n = a.cols(), k = std::min(m, n);
+    if (const Outcome bad = u.resize(m, full ? m : k))
+        return bad;
+    if (const Outcome bad = s.resize(k))
+        return bad;
+    if (const Outcome bad = v.resize(n, full ? n : k))
+        return bad;
+    return SVDecompose(a.data(), m, n, u.data(), s.data(), v.data(), full);
+}
+
+template <class Matrix>
+Outcome SVDValues(In<Matrix> a, Out<DBL1D> s) {
+    if (a.isEmpty())
+        return ErrEmptyInput;
+    if (const Outcome bad = s.resize(std::min(a.rows(), a.cols())))
+        return bad;
+    return SingularValues(a.data(), a.rows(), a.cols(), s.data());
+}
+
+bool IsNoRange(int32_t low, int32_t high, int32_t n) { return low < 1 || high < low || high > n; }
+
+template <class Matrix>
+Outcome Hessenberg(InOut<Matrix> a, int32_t low, int32_t high, Out<Matrix> q) {
+    const int32_t n = a.rows();
+    if (const ErrorCode bad = FirstFailed({{a.isEmpty(), ErrEmptyInput},
+                                           {!a.isSquare(), ErrNotSquare},
+                                           {IsNoRange(low, high, n), ErrIndexOutOfRange}}))
+        return bad;
+    if (const Outcome bad = q.resize(n, n))
+        return bad;
+    if (CheckFinite(a.data(), int64_t{n} * n) != 0)
+        return ErrNonFiniteInput;
+    if (const ErrorCode failed =
+            ReduceToHessenberg<elementOf<Matrix>>(a.data(), n, n, low - 1, high - 1, q.data(), n))
+        return failed;
+    for (int32_t i = 2; i < n; ++i)
+        for (int32_t j = 0; j < i - 1; ++j)
+            a.data()[i * n + j] = {};
+    return 0;
+}
+
+enum BalanceJob : int32_t { balanceNothing = 0, balanceBoth = 3 };
+bool IsNoJob(int32_t job) { return job < balanceNothing || job > balanceBoth; }
+bool Permutes(int32_t job) { return (job & 1) != 0; }
+bool Scales(int32_t job) { return (job & 2) != 0; }
+
+// Outside the block the exchanges are counted from 1, as low and high are.
+template <class Matrix>
+Outcome BalanceMatrix(InOut<Matrix> a, int32_t job, OutI32 low, OutI32 high, Out<DBL1D> scale) {
+    const int32_t n = a.rows();
+    if (const ErrorCode bad = FirstFailed({{a.isEmpty(), ErrEmptyInput},
+                                           {!a.isSquare(), ErrNotSquare},
+                                           {IsNoJob(job), ErrInvalidSelector}}))
+        return bad;
+    if (const Outcome bad = scale.resize(n))
+        return bad;
+    if (CheckFinite(a.data(), int64_t{n} * n) != 0)
+        return ErrNonFiniteInput;
+    const Balanced range =
+        Balance<elementOf<Matrix>>(a.data(), n, n, Permutes(job), Scales(job), scale.data());
+    const bool single = Permutes(job) && range.low == range.high;
+    for (int32_t i = 0; i < n; ++i)
+        if (single || i < range.low || i > range.high)
+            scale.data()[i] += 1.0;
+    low = range.low + 1;
+    high = range.high + 1;
+    return 0;
+}
+
+// Whether an exchange of rows, counted from 1, leads to no row.
+bool LeavesRows(const DBL *scale, int32_t from, int32_t to, int32_t n) {
+    for (int32_t i = from; i < to; ++i)
+        if (!(scale[i] >= 1.0 && scale[i] < n + 1.0))
+            return true;
+    return false;
+}
+
+template <class Matrix>
+Outcome VectorsBack(int32_t job, int32_t side, int32_t low, int32_t high, In<DBL1D> scale,
+                    InOut<Matrix> v) {
+    const int32_t n = v.rows();
+    if (const ErrorCode bad = FirstFailed({{v.isEmpty() || scale.isEmpty(), ErrEmptyInput},
+                                           {IsNoJob(job), ErrInvalidSelector},
+                                           {side != 0 && side != 1, ErrInvalidSelector},
+                                           {scale.size() != n, ErrSizeMismatch},
+                                           {IsNoRange(low, high, n), ErrIndexOutOfRange}}))
+        return bad;
+    constexpr ElementType E = elementOf<Matrix>;
+    const Balanced range = {low - 1, high - 1};
+    if (Permutes(job) &&
+        (LeavesRows(scale.data(), 0, range.low, n) || LeavesRows(scale.data(), high, n, n)))
+        return ErrIndexOutOfRange;
+    Scratch<ElementType::DBL> fromZero;
+    if (const ErrorCode failed = fromZero.allocate(n))
+        return failed;
+    for (int32_t i = 0; i < n; ++i)
+        fromZero[i] = i < range.low || i > range.high ? scale.data()[i] - 1.0 : scale.data()[i];
+    if (Scales(job))
+        UndoScaling<E>(fromZero.data(), range,
+                       side == 0 ? EigenvectorSide::Right : EigenvectorSide::Left, v.data(),
+                       v.cols(), v.cols());
+    if (Permutes(job))
+        UndoPermutation<E>(fromZero.data(), range, n, v.data(), v.cols(), v.cols());
+    return 0;
+}
+
+} // namespace
+} // namespace qx
+
+using qx::InErr;
+using qx::Returned;
+
+int32_t LU_head(DBL2D a, I32_1D pivots, int32_t *parity, ErrorCode *err) {
+    return InErr(err, qx::LU<DBL2D>, a, pivots, parity);
+}
+int32_t CxLU_head(CDB2D a, I32_1D pivots, int32_t *parity, ErrorCode *err) {
+    return InErr(err, qx::LU<CDB2D>, a, pivots, parity);
+}
+
+int32_t Cholesky_head(DBL1D packed, ErrorCode *err) {
+    return InErr(err, qx::Cholesky<DBL1D>, packed);
+}
+int32_t CxCholesky_head(CDB1D packed, ErrorCode *err) {
+    return InErr(err, qx::Cholesky<CDB1D>, packed);
+}
+int32_t FullCholesky_head(DBL2D a, ErrorCode *err) {
+    return InErr(err, qx::FullCholesky<DBL2D>, a);
+}
+int32_t CxFullCholesky_head(CDB2D a, ErrorCode *err) {
+    return InErr(err, qx::FullCholesky<CDB2D>, a);
+}
+int32_t Cholesky_InvMatrix_head(DBL1D packedFactor, ErrorCode *err) {
+    return InErr(err, qx::InverseFromFactor<DBL1D>, packedFactor);
+}
+int32_t CxCholesky_InvMatrix_head(CDB1D packedFactor, ErrorCode *err) {
+    return InErr(err, qx::InverseFromFactor<CDB1D>, packedFactor);
+}
+int32_t InvMatrixChoDri_head(DBL2D a, ErrorCode *err) {
+    return InErr(err, qx::InversePositiveDefinite<DBL2D>, a);
+}
+int32_t CxInvMatrixChoDri_head(CDB2D a, ErrorCode *err) {
+    return InErr(err, qx::InversePositiveDefinite<CDB2D>, a);
+}
+int32_t PreallocInvMatrixChoDri_H(DBL2D a, DBL1D packedWork, ErrorCode *err) {
+    return InErr(err, qx::InversePreallocated, a, packedWork);
+}
+
+int32_t Tri_InvMatrix_head(PackedTriangle *a, ErrorCode *err) {
+    return InErr(err, qx::InversePackedTriangle<DBL1D>, a->packed, a->triangle);
+}
+int32_t CxTri_InvMatrix_head(CxPackedTriangle *a, ErrorCode *err) {
+    return InErr(err, qx::InversePackedTriangle<CDB1D>, a->packed, a->triangle);
+}
+int32_t InvMatrixTriDri_head(DBL2D a, const int32_t *triangle, ErrorCode *err) {
+    return InErr(err, qx::InverseTriangle<DBL2D>, a, *triangle);
+}
+int32_t CxInvMatrixTriDri_head(CDB2D a, const int32_t *triangle, ErrorCode *err) {
+    return InErr(err, qx::InverseTriangle<CDB2D>, a, *triangle);
+}
+
+int32_t qrd_head(DBL2D a, const int32_t *algorithm, DBL2D q, DBL2D r, ErrorCode *err) {
+    return InErr(err, qx::QRByAlgorithm<DBL2D>, a, *algorithm, q, r);
+}
+int32_t Cxqrd_head(CDB2D a, const int32_t *algorithm, CDB2D q, CDB2D r, ErrorCode *err) {
+    return InErr(err, qx::QRByAlgorithm<CDB2D>, a, *algorithm, q, r);
+}
+ErrorCode QRDecH(DBL2D a, int32_t pivoting, int32_t economy, I32_2D permutation, DBL2D q, DBL2D r) {
+    return Returned(qx::QR<DBL2D>, a, pivoting != 0, economy, permutation, q, r);
+}
+ErrorCode CxQRDecH(CDB2D a, int32_t pivoting, int32_t economy, I32_2D permutation, CDB2D q,
+                   CDB2D r) {
+    return Returned(qx::QR<CDB2D>, a, pivoting != 0, economy, permutation, q, r);
+}
+
+int32_t SVD_head(DBL2D a, DBL1D s, DBL2D v, ErrorCode *err) {
+    return InErr(err, qx::SVDInPlace<DBL2D>, a, s, v);
+}
+int32_t CxSVD_head(CDB2D a, DBL1D s, CDB2D v, ErrorCode *err) {
+    return InErr(err, qx::SVDInPlace<CDB2D>, a, s, v);
+}
+ErrorCode SVDEx_head(DBL2D a, int32_t fullSize, DBL2D u, DBL1D s, DBL2D v) {
+    return Returned(qx::SVD<DBL2D>, a, fullSize != 0, u, s, v);
+}
+ErrorCode CxSVDEx_head(CDB2D a, int32_t fullSize, CDB2D u, DBL1D s, CDB2D v) {
+    return Returned(qx::SVD<CDB2D>, a, fullSize != 0, u, s, v);
+}
+int32_t SVDS_head(DBL2D a, DBL1D s, ErrorCode *err) {
+    return InErr(err, qx::SVDValues<DBL2D>, a, s);
+}
+int32_t CxSVDS_head(CDB2D a, DBL1D s, ErrorCode *err) {
+    return InErr(err, qx::SVDValues<CDB2D>, a, s);
+}
+
+ErrorCode Hessenberg_head(DBL2D a, int32_t low, int32_t high, DBL2D q) {
+    return Returned(qx::Hessenberg<DBL2D>, a, low, high, q);
+}
+ErrorCode CxHessenberg_head(CDB2D a, int32_t low, int32_t high, CDB2D q) {
+    return Returned(qx::Hessenberg<CDB2D>, a, low, high, q);
+}
+ErrorCode MatrixBalance_head(DBL2D a, int32_t job, int32_t *low, int32_t *high, DBL1D scale) {
+    return Returned(qx::BalanceMatrix<DBL2D>, a, job, low, high, scale);
+}
+ErrorCode CxMatrixBalance_head(CDB2D a, int32_t job, int32_t *low, int32_t *high, DBL1D scale) {
+    return Returned(qx::BalanceMatrix<CDB2D>, a, job, low, high, scale);
+}
+ErrorCode EigenVBack_head(int32_t job, int32_t side, int32_t low, int32_t high, DBL1D scale,
+                          DBL2D v) {
+    return Returned(qx::VectorsBack<DBL2D>, job, side, low, high, scale, v);
+}
+ErrorCode CxEigenVBack_head(int32_t job, int32_t side, int32_t low, int32_t high, DBL1D scale,
+                            CDB2D v) {
+    return Returned(qx::VectorsBack<CDB2D>, job, side, low, high, scale, v);
+}

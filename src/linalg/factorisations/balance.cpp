@@ -1,0 +1,160 @@
+#include "linalg/factorisations/balance.h"
+
+#include <cmath>
+
+namespace qx {
+namespace {
+
+template <ElementType E>
+class Balancing {
+    typedef ElementOf<E> T;
+
+public:
+    Balancing(T *a, std::ptrdiff_t stride, int32_t n, DBL *scale)
+        : a_(a), stride_(stride), n_(n), high_(n - 1), scale_(scale) {}
+
+    void permute() {
+        for (int32_t j = high_; j >= 0 && high_ > 0;) {
+            const bool isolated = rowIsZeroBut(j);
+            if (isolated) {
+                exchange(j, high_);
+                --high_;
+            }
+            j = isolated ? high_ : j - 1;
+        }
+        if (high_ == 0) {
+            scale_[0] = 0;
+            return;
+        }
+        for (int32_t j = low_; j <= high_;) {
+            const bool isolated = columnIsZeroBut(j);
+            if (isolated) {
+                exchange(j, low_);
+                ++low_;
+            }
+            j = isolated ? low_ : j + 1;
+        }
+    }
+    // One pass over the block; whether it changed anything.
+    bool scaleOnce() {
+        bool changed = false;
+        for (int32_t i = low_; i <= high_; ++i)
+            changed |= scaleOne(i);
+        return changed;
+    }
+    Balanced range() const { return {low_, high_}; }
+
+private:
+    T *at(int32_t row) const { return a_ + row * stride_; }
+
+    bool rowIsZeroBut(int32_t j) const {
+        for (int32_t i = 0; i <= high_; ++i)
+            if (i != j && AbsSum(at(j)[i]) != 0.0)
+                return false;
+        return true;
+    }
+    bool columnIsZeroBut(int32_t j) const {
+        for (int32_t i = low_; i <= high_; ++i)
+            if (i != j && AbsSum(at(i)[j]) != 0.0)
+                return false;
+        return true;
+    }
+    void exchange(int32_t j, int32_t m) {
+        scale_[m] = j;
+        if (j == m)
+            return;
+        for (int32_t i = 0; i <= high_; ++i)
+            Swap(&at(i)[j], &at(i)[m]);
+        for (int32_t i = low_; i < n_; ++i)
+            Swap(&at(j)[i], &at(m)[i]);
+    }
+
+    bool scaleOne(int32_t i) {
+        double column = 0.0, row = 0.0;
+        for (int32_t j = low_; j <= high_; ++j)
+            if (j != i) {
+                column += AbsSum(at(j)[i]);
+                row += AbsSum(at(i)[j]);
+            }
+        const double sum = column + row;
+        // A sum that overflows would never meet its bound.
+        if (column == 0.0 || row == 0.0 || !std::isfinite(sum))
+            return false;
+        double factor = 1.0;
+        for (const double bound = row * 0.5; column < bound; column *= 4.0)
+            factor *= 2.0;
+        for (const double bound = row * 2.0; column >= bound; column *= 0.25)
+            factor *= 0.5;
+        if (!((column + row) / factor < sum * 0.95))
+            return false;
+        scale_[i] *= factor;
+        const double inverse = 1.0 / factor;
+        for (int32_t j = low_; j < n_; ++j)
+            at(i)[j] = at(i)[j] * inverse;
+        for (int32_t j = 0; j <= high_; ++j)
+            at(j)[i] = at(j)[i] * factor;
+        return true;
+    }
+
+    T *a_;
+    std::ptrdiff_t stride_;
+    int32_t n_, low_ = 0, high_;
+    DBL *scale_;
+};
+
+} // namespace
+
+template <ElementType E>
+Balanced Balance(ElementOf<E> *a, std::ptrdiff_t stride, int32_t n, bool permute, bool scaleToo,
+                 DBL *scale) {
+    Balancing<E> balancing(a, stride, n, scale);
+    if (permute)
+        balancing.permute();
+    const Balanced range = balancing.range();
+    // A block of one element is an isolated eigenvalue, exchanged with itself.
+    const bool single = permute && range.low == range.high;
+    for (int32_t i = range.low; i <= range.high; ++i)
+        scale[i] = single ? i : 1.0;
+    while (scaleToo && !single && balancing.scaleOnce()) {
+    }
+    return range;
+}
+
+template <ElementType E>
+void UndoScaling(const DBL *scale, Balanced range, EigenvectorSide side, ElementOf<E> *v,
+                 std::ptrdiff_t stride, int32_t cols) {
+    if (range.low == range.high)
+        return;
+    for (int32_t i = range.low; i <= range.high; ++i) {
+        const double factor = side == EigenvectorSide::Right ? scale[i] : 1.0 / scale[i];
+        for (int32_t j = 0; j < cols; ++j)
+            v[i * stride + j] = v[i * stride + j] * factor;
+    }
+}
+
+template <ElementType E>
+void UndoPermutation(const DBL *scale, Balanced range, int32_t n, ElementOf<E> *v,
+                     std::ptrdiff_t stride, int32_t cols) {
+    const auto exchange = [=](int32_t i) {
+        const auto other = static_cast<int32_t>(scale[i]);
+        for (int32_t j = 0; other != i && j < cols; ++j)
+            Swap(&v[i * stride + j], &v[other * stride + j]);
+    };
+    for (int32_t i = range.low - 1; i >= 0; --i)
+        exchange(i);
+    for (int32_t i = range.high + 1; i < n; ++i)
+        exchange(i);
+}
+
+template Balanced Balance<ElementType::DBL>(DBL *, std::ptrdiff_t, int32_t, bool, bool, DBL *);
+template Balanced Balance<ElementType::CDB>(CDB *, std::ptrdiff_t, int32_t, bool, bool, DBL *);
+template void UndoScaling<ElementType::DBL>(const DBL *, Balanced, EigenvectorSide, DBL *,
+                                            std::ptrdiff_t, int32_t);
+template void UndoScaling<ElementType::CDB>(const DBL *, Balanced, EigenvectorSide, CDB *,
+                                            std::ptrdiff_t, int32_t);
+template void UndoPermutation<ElementType::DBL>(const DBL *, Balanced, int32_t, DBL *,
+                                                std::ptrdiff_t, int32_t);
+template void UndoPermutation<ElementType::CDB>(const DBL *, Balanced, int32_t, CDB *,
+                                                std::ptrdiff_t, int32_t);
+
+} // namespace qx

@@ -1,0 +1,34 @@
+#ifndef QX_LINALG_FACTORISATIONS_BALANCE_H
+#define QX_LINALG_FACTORISATIONS_BALANCE_H
+
+#include "linalg/scalar.h"
+
+namespace qx {
+
+// Balancing of a square matrix (B. N. Parlett and C. Reinsch, "Balancing a matrix for calculation
+// of eigenvalues and eigenvectors", 1969): a similarity with a permutation, which isolates
+// eigenvalues in the corners, and with powers of two, which make rows and columns of the block in
+// between alike. The elements must be finite.
+//
+// Rows and columns low to high (from 0) are the block. scale[i] is the factor of row and column i
+// of the block, and outside of it the index with which i was exchanged.
+struct Balanced {
+    int32_t low, high;
+};
+template <ElementType E>
+Balanced Balance(ElementOf<E> *a, std::ptrdiff_t stride, int32_t n, bool permute, bool scaleToo,
+                 DBL *scale);
+
+// Eigenvectors of the balanced matrix, in the columns of the n by cols matrix v, become those of
+// the original one: factors, then exchanges. Left eigenvectors take the inverse factors.
+enum class EigenvectorSide { Right, Left };
+template <ElementType E>
+void UndoScaling(const DBL *scale, Balanced range, EigenvectorSide side, ElementOf<E> *v,
+                 std::ptrdiff_t stride, int32_t cols);
+template <ElementType E>
+void UndoPermutation(const DBL *scale, Balanced range, int32_t n, ElementOf<E> *v,
+                     std::ptrdiff_t stride, int32_t cols);
+
+} // namespace qx
+
+#endif

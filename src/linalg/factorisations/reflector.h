@@ -1,0 +1,87 @@
+#ifndef QX_LINALG_FACTORISATIONS_REFLECTOR_H
+#define QX_LINALG_FACTORISATIONS_REFLECTOR_H
+
+#include "linalg/kernels.h"
+#include "linalg/scalar.h"
+
+namespace qx {
+
+// Elementary unitary matrices H = I - v v^H / kappa (A. S. Householder). H maps the vector x that
+// it is made from to (beta, 0, ..., 0) with real beta; its inverse is H^H, which has the conjugate
+// of kappa. kappa 0 stands for H = I.
+template <ElementType E>
+class Reflector {
+    typedef ElementOf<E> T;
+    typedef typename ScalarOf<E>::type Value;
+
+public:
+    // Which vectors need no reflection: none but the zero vector, or each that is already (beta,
+    // 0, ..., 0), as in LAPACK.
+    enum class Leave { ZeroOnly, Reduced };
+
+    // x[0], x[stride], ... becomes v. The vector is scaled by the sum of its absolute values, so
+    // that no square overflows, and beta gets the sign opposite to x[0], so that nothing cancels.
+    Reflector(T *x, std::ptrdiff_t stride, int32_t n, Leave leave) {
+        double scale = 0.0;
+        for (int32_t i = 1; i < n; ++i)
+            scale += AbsSum(x[i * stride]);
+        if (leave == Leave::Reduced && scale == 0.0 && ImagPart(x[0]) == 0.0) {
+            beta = RealPart(x[0]);
+            return;
+        }
+        scale += AbsSum(x[0]);
+        if (scale == 0.0)
+            return;
+        double squares = 0.0;
+        for (int32_t i = 0; i < n; ++i) {
+            x[i * stride] = x[i * stride] / scale;
+            squares += SquaredModulus(x[i * stride]);
+        }
+        const Value first = x[0];
+        const double norm = -std::copysign(std::sqrt(squares), RealPart(first));
+        kappa = ScalarOf<E>::Of(squares) - first * norm;
+        x[0] = first - ScalarOf<E>::Of(norm);
+        beta = norm * scale;
+    }
+
+    double beta = 0.0;
+    Value kappa = ScalarOf<E>::Of(0.0);
+};
+
+// a becomes H a: a - v (v^H a) / kappa. v is contiguous; `work` holds rows + cols elements.
+template <ElementType E>
+void ReflectFromLeft(ElementOf<E> *a, std::ptrdiff_t stride, int32_t rows, int32_t cols,
+                     const ElementOf<E> *v, typename ScalarOf<E>::type kappa, ElementOf<E> *work) {
+    typedef ElementOf<E> T;
+    if (AbsSum(kappa) == 0.0 || cols < 1)
+        return;
+    T *const conjugate = work, *const product = work + rows;
+    for (int32_t i = 0; i < rows; ++i)
+        conjugate[i] = Conj(v[i]);
+    for (int32_t j = 0; j < cols; ++j)
+        product[j] = T{};
+    AddTransposedProduct(a, stride, rows, cols, conjugate, product);
+    for (int32_t j = 0; j < cols; ++j)
+        product[j] = -(product[j] / kappa);
+    AddOuterProduct(a, stride, rows, cols, v, product);
+}
+
+// a becomes a H: a - (a v) v^H / kappa. `work` holds rows + cols elements.
+template <ElementType E>
+void ReflectFromRight(ElementOf<E> *a, std::ptrdiff_t stride, int32_t rows, int32_t cols,
+                      const ElementOf<E> *v, typename ScalarOf<E>::type kappa, ElementOf<E> *work) {
+    typedef ElementOf<E> T;
+    if (AbsSum(kappa) == 0.0 || rows < 1)
+        return;
+    T *const conjugate = work, *const product = work + cols;
+    for (int32_t j = 0; j < cols; ++j)
+        conjugate[j] = Conj(v[j]);
+    RowProducts(a, stride, rows, cols, v, product);
+    for (int32_t i = 0; i < rows; ++i)
+        product[i] = -(product[i] / kappa);
+    AddOuterProduct(a, stride, rows, cols, product, conjugate);
+}
+
+} // namespace qx
+
+#endif

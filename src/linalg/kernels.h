@@ -1,0 +1,97 @@
+#ifndef QX_LINALG_KERNELS_H
+#define QX_LINALG_KERNELS_H
+
+#include "frame/widths.h"
+#include "qx/types.h"
+
+#include <cstddef>
+
+namespace qx {
+
+// The inner loops of the factorisations, on row-major blocks whose rows stand `stride` elements
+// apart. Every element has one order of arithmetic, whatever the width.
+
+// y[j] += sum over i of x[i] a[i][j], i ascending.
+QX_BY_WIDTH(void, AddTransposedProductReal,
+            (const DBL *a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const DBL *x, DBL *y))
+QX_BY_WIDTH(void, AddTransposedProductComplex,
+            (const CDB *a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const CDB *x, CDB *y))
+
+// a[i][j] += x[i] y[j].
+QX_BY_WIDTH(void, AddOuterProductReal,
+            (DBL * a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const DBL *x,
+             const DBL *y))
+QX_BY_WIDTH(void, AddOuterProductComplex,
+            (CDB * a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const CDB *x,
+             const CDB *y))
+
+// y[i] = sum over j of a[i][j] x[j]. Real sums run in eight partial sums, element j in sum j mod
+// 8, which are then added pairwise, and the last (cols mod 8) terms follow; complex ones in two.
+QX_BY_WIDTH(void, RowProductsReal,
+            (const DBL *a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const DBL *x, DBL *y))
+QX_BY_WIDTH(void, RowProductsComplex,
+            (const CDB *a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const CDB *x, CDB *y))
+
+// Rows p and q become c p + s q and c q - s p.
+struct Rotation {
+    int32_t p, q;
+    double c, s;
+};
+// The rotations one after the other, on rows of `width` doubles.
+QX_BY_WIDTH(void, RotateRows,
+            (DBL * a, std::ptrdiff_t stride, int32_t width, const Rotation *rotations,
+             int32_t count))
+
+// Rows p and q become c p + s q and c q - conj(s) p.
+QX_BY_WIDTH(void, RotateComplexRows, (CDB * p, CDB *q, int32_t width, double c, CDB s))
+
+// Rows first, first + 1 and, where size is 3, first + 2 each lose w[i] p, where p = u[0] row0 +
+// u[1] row1 + u[2] row2.
+struct SmallReflection {
+    int32_t first, size;
+    double u[3], w[3];
+};
+// The reflections one after the other, on rows of `width` doubles.
+QX_BY_WIDTH(void, ReflectRows,
+            (DBL * a, std::ptrdiff_t stride, int32_t width, const SmallReflection *reflections,
+             int32_t count))
+// The same on columns, of the first `rows` rows.
+QX_BY_WIDTH(void, ReflectColumns,
+            (DBL * a, std::ptrdiff_t stride, int32_t rows, const SmallReflection *reflection))
+
+// The names by which templates over the element reach them.
+inline void AddTransposedProduct(const DBL *a, std::ptrdiff_t stride, int32_t rows, int32_t cols,
+                                 const DBL *x, DBL *y) {
+    AddTransposedProductReal(a, stride, rows, cols, x, y);
+}
+inline void AddTransposedProduct(const CDB *a, std::ptrdiff_t stride, int32_t rows, int32_t cols,
+                                 const CDB *x, CDB *y) {
+    AddTransposedProductComplex(a, stride, rows, cols, x, y);
+}
+inline void AddOuterProduct(DBL *a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const DBL *x,
+                            const DBL *y) {
+    AddOuterProductReal(a, stride, rows, cols, x, y);
+}
+inline void AddOuterProduct(CDB *a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const CDB *x,
+                            const CDB *y) {
+    AddOuterProductComplex(a, stride, rows, cols, x, y);
+}
+inline void RowProducts(const DBL *a, std::ptrdiff_t stride, int32_t rows, int32_t cols,
+                        const DBL *x, DBL *y) {
+    RowProductsReal(a, stride, rows, cols, x, y);
+}
+inline void RowProducts(const CDB *a, std::ptrdiff_t stride, int32_t rows, int32_t cols,
+                        const CDB *x, CDB *y) {
+    RowProductsComplex(a, stride, rows, cols, x, y);
+}
+
+// The distance of rows in scratch matrices: an odd number of cache lines, because with rows a
+// power of two apart a column falls into few sets of the cache.
+constexpr std::ptrdiff_t PaddedStride(int32_t cols) {
+    const std::ptrdiff_t lines = (std::ptrdiff_t{cols} + 7) / 8;
+    return 8 * (lines | 1);
+}
+
+} // namespace qx
+
+#endif

@@ -1,0 +1,472 @@
+#include "linalg/factorisations/qr.h"
+#include "linalg/factorisations/svd.h"
+#include "linalg/tests/exact.h"
+#include "linalg/tests/host_matrix.h"
+#include "linalg/tests/matrices.h"
+#include "qx/qx.h"
+
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <limits>
+#include <stdexcept>
+#include <string>
+#include <tuple>
+#include <vector>
+
+namespace {
+
+using namespace qx::test;
+
+constexpr double inf = std::numeric_limits<double>::infinity();
+const double nan = std::numeric_limits<double>::quiet_NaN();
+
+const std::vector<std::pair<int, int>> shapes = {{1, 1}, {1, 5}, {5, 1},   {2, 2},
+                                                 {9, 4}, {4, 9}, {17, 17}, {40, 33}};
+
+// Calls check(a, m, n, kind) with real and complex matrices of every kind and shape.
+template <class Check>
+void ForEveryMatrix(Check check) {
+    for (const auto &[m, n] : shapes)
+        for (const MatrixKind &kind : MatrixKinds()) {
+            SCOPED_TRACE(testing::Message() << m << " by " << n << ", " << kind.name);
+            check(RealMatrix(kind, m, n), m, n);
+            check(ComplexMatrix(kind, m, n), m, n);
+        }
+}
+
+TEST(SingularValueDecomposition, GivesTheMatrixBackFromUnitaryFactors) {
+    ForEveryMatrix([](const auto &a, int m, int n) {
+        typedef std::decay_t<decltype(a)> Elements;
+        const int k = std::min(m, n);
+        for (const int full : {0, 1}) {
+            const int uCols = full ? m : k, vCols = full ? n : k;
+            Elements u(m * uCols), v(n * vCols);
+            std::vector<double> s(k), alone(k);
+            ASSERT_EQ(qx::SVDecompose(a.data(), m, n, u.data(), s.data(), v.data(), full), 0);
+            Exact sigma(uCols, vCols);
+            for (int i = 0; i < k; ++i)
+                sigma(i, i) = s[i];
+            const Exact U(m, uCols, u.data()), V(n, vCols, v.data());
+            EXPECT_LT(Deviation(U * sigma * V.adjoint(), Exact(m, n, a.data())), 4.0);
+            EXPECT_LT(FromUnitary(U), 8.0);
+            EXPECT_LT(FromUnitary(V), 8.0);
+            EXPECT_TRUE(std::is_sorted(s.rbegin(), s.rend()));
+            EXPECT_GE(s.back(), 0.0);
+            ASSERT_EQ(qx::SingularValues(a.data(), m, n, alone.data()), 0);
+            EXPECT_EQ(alone, s);
+        }
+    });
+}
+
+TEST(SingularValueDecomposition, TakesWhatLiesBelowEpsilonForZero) {
+    // Whatever the norm: this matrix has the value 3e-17, but no rotation is made, and the length
+    // of the first column remains.
+    const std::vector<double> a = {1e-17, 2e-17, 2e-17, 1e-17};
+    std::vector<double> s(2);
+    ASSERT_EQ(qx::SingularValues(a.data(), 2, 2, s.data()), 0);
+    EXPECT_NEAR(s[0], std::sqrt(5.0) * 1e-17, 1e-31);
+}
+
+TEST(QRDecomposition, GivesTheMatrixBackFromAUnitaryAndATriangularFactor) {
+    ForEveryMatrix([](const auto &a, int m, int n) {
+        typedef std::decay_t<decltype(a)> Elements;
+        for (const int form : {qx::qrFull, qx::qrEconomical, qx::qrOnlyR}) {
+            const int size = form == qx::qrFull ? m : std::min(m, n);
+            Elements q(m * size), r(size * n), alone(size * n);
+            ASSERT_EQ(qx::QRDecompose(a.data(), m, n, form, q.data(), r.data()), 0);
+            const Exact A(m, n, a.data()), R(size, n, r.data());
+            EXPECT_EQ(R.below(), 0.0);
+            if (form == qx::qrOnlyR) {
+                EXPECT_LT(Deviation(R.adjoint() * R, A.adjoint() * A), 8.0);
+                continue;
+            }
+            const Exact Q(m, size, q.data());
+            EXPECT_LT(Deviation(Q * R, A), 4.0);
+            EXPECT_LT(FromUnitary(Q), 8.0);
+        }
+    });
+}
+
+TEST(QRDecomposition, TakesTheLongestColumnFirst) {
+    ForEveryMatrix([](const auto &a, int m, int n) {
+        typedef std::decay_t<decltype(a)> Elements;
+        const int k = std::min(m, n);
+        Elements q(m * k), r(k * n);
+        std::vector<int32_t> pivots(n);
+        ASSERT_EQ(qx::QRDecomposePivoted(a.data(), m, n, qx::qrEconomical, pivots.data(), q.data(),
+                                         r.data()),
+                  0);
+        Exact permuted(m, n);
+        const Exact A(m, n, a.data()), Q(m, k, q.data()), R(k, n, r.data());
+        for (int i = 0; i < m; ++i)
+            for (int j = 0; j < n; ++j)
+                permuted(i, j) = A(i, pivots[j]);
+        EXPECT_LT(Deviation(Q * R, permuted), 4.0);
+        EXPECT_LT(FromUnitary(Q), 8.0);
+        for (int i = 1; i < k; ++i)
+            EXPECT_LE(std::abs(R(i, i)), std::abs(R(i - 1, i - 1)) * (1.0L + 1e-7L)) << i;
+        std::sort(pivots.begin(), pivots.end());
+        for (int j = 0; j < n; ++j)
+            EXPECT_EQ(pivots[j], j);
+    });
+}
+
+TEST(QRDecomposition, GramSchmidtStaysUnitaryOnDependentColumns) {
+    ForEveryMatrix([](const auto &a, int m, int n) {
+        typedef std::decay_t<decltype(a)> Elements;
+        for (const auto order : {qx::GramSchmidt::Modified, qx::GramSchmidt::Classical}) {
+            Elements q(m * m), r(m * n);
+            ASSERT_EQ(qx::QRByGramSchmidt(a.data(), m, n, order, q.data(), r.data()), 0);
+            const Exact Q(m, m, q.data()), R(m, n, r.data());
+            EXPECT_EQ(R.below(), 0.0);
+            EXPECT_LT(Deviation(Q * R, Exact(m, n, a.data())), 4.0);
+            EXPECT_LT(FromUnitary(Q), 8.0);
+            for (int i = 0; i < std::min(m, n); ++i)
+                EXPECT_GE(R(i, i).real(), 0.0L);
+        }
+    });
+}
+
+const MatrixKind &Kind(const char *name) {
+    for (const MatrixKind &kind : MatrixKinds())
+        if (kind.name == std::string(name))
+            return kind;
+    throw std::out_of_range(name);
+}
+
+template <class Elements, class Export>
+void ExpectLU(const Elements &elements, int m, int n, Export lu) {
+    auto a = Matrix(m, n, elements);
+    const Exact before = Contents(a);
+    I32Array pivots;
+    int32_t parity;
+    ErrorCode err;
+    ASSERT_EQ(lu(a.handle(), pivots.handle(), &parity, &err), 0);
+    ASSERT_GE(err, 0);
+    const int k = std::min(m, n);
+    Exact L(m, k), U(k, n), permuted = before;
+    const Exact factors = Contents(a);
+    for (int i = 0; i < m; ++i)
+        for (int j = 0; j < n; ++j)
+            (j < i && j < k ? L(i, j) : U(i, j)) = factors(i, j);
+    int exchanges = 0;
+    for (int i = 0; i < k; ++i)
+        L(i, i) = 1;
+    for (int i = 0; i < m; ++i)
+        if (pivots.data()[i] != i) {
+            ++exchanges;
+            for (int j = 0; j < n; ++j)
+                std::swap(permuted(i, j), permuted(pivots.data()[i], j));
+        }
+    EXPECT_LT(Deviation(L * U, permuted), 4.0);
+    EXPECT_EQ(parity, exchanges % 2);
+    for (int i = 0; i < m; ++i)
+        for (int j = 0; j < std::min(i, k); ++j)
+            EXPECT_LE(std::abs(L(i, j)), 1.0L);
+}
+TEST(LU, GivesThePermutedMatrixBack) {
+    for (const char *kind : {"random", "graded", "Hilbert", "Frank"})
+        for (const auto &[m, n] : shapes) {
+            SCOPED_TRACE(testing::Message() << m << " by " << n << ", " << kind);
+            ExpectLU(RealMatrix(Kind(kind), m, n), m, n, LU_head);
+            ExpectLU(ComplexMatrix(Kind(kind), m, n), m, n, CxLU_head);
+        }
+}
+TEST(LU, KeepsTheFactorsOfASingularMatrix) {
+    const DBL2DArray a(2, 2, {2.0, 4.0, 1.0, 2.0});
+    I32Array pivots;
+    int32_t parity;
+    ErrorCode err;
+    LU_head(a.handle(), pivots.handle(), &parity, &err);
+    EXPECT_EQ(err, WarnSingular);
+    EXPECT_EQ(a.values(), (std::vector<double>{2.0, 4.0, 0.5, 0.0}));
+}
+
+// b b^H + I, which is positive definite, and its lower triangle in packed storage.
+template <class T>
+struct PositiveDefinite {
+    explicit PositiveDefinite(const std::vector<T> &b, int n) : a(b) {
+        const Exact B(n, n, b.data());
+        const Exact A = B * B.adjoint();
+        for (int i = 0; i < n; ++i)
+            for (int j = 0; j < n; ++j)
+                set(a[i * n + j], A(i, j) + static_cast<long double>(i == j));
+        for (int j = 0; j < n; ++j)
+            for (int i = j; i < n; ++i)
+                packed.push_back(a[i * n + j]);
+    }
+    static void set(double &x, std::complex<long double> value) {
+        x = static_cast<double>(value.real());
+    }
+    static void set(CDB &x, std::complex<long double> value) {
+        x = {static_cast<double>(value.real()), static_cast<double>(value.imag())};
+    }
+    std::vector<T> a, packed;
+};
+template <class Array>
+Exact FromPacked(const Array &packed, int n) {
+    const Exact elements(1, packed.size(), packed.data());
+    Exact lower(n, n);
+    int index = 0;
+    for (int j = 0; j < n; ++j)
+        for (int i = j; i < n; ++i)
+            lower(i, j) = elements(0, index++);
+    return lower;
+}
+
+template <class T, class Packed, class Full>
+void ExpectCholesky(const std::vector<T> &b, int n, Packed cholesky, Packed invert, Full full,
+                    Full inverse) {
+    const PositiveDefinite<T> matrix(b, n);
+    const Exact A(n, n, matrix.a.data());
+    auto packed = Vector(matrix.packed);
+    ErrorCode err;
+    ASSERT_EQ(cholesky(packed.handle(), &err), 0);
+    ASSERT_EQ(err, 0);
+    const Exact L = FromPacked(packed, n);
+    EXPECT_LT(Deviation(L * L.adjoint(), A), 4.0);
+
+    auto square = Matrix(n, n, matrix.a);
+    full(square.handle(), &err);
+    ASSERT_EQ(err, 0);
+    EXPECT_EQ((Contents(square) - L).norm(), 0.0L);
+
+    auto inverted = Matrix(n, n, matrix.a);
+    inverse(inverted.handle(), &err);
+    ASSERT_EQ(err, 0);
+    const Exact inverseMatrix = Contents(inverted);
+    const long double condition = A.norm() * inverseMatrix.norm();
+    EXPECT_LT((A * inverseMatrix - Exact::Identity(n)).norm(), 4.0L * n * 0x1p-52L * condition);
+    EXPECT_EQ((inverseMatrix - inverseMatrix.adjoint()).norm(), 0.0L);
+
+    invert(packed.handle(), &err);
+    ASSERT_EQ(err, 0);
+    const Exact triangle = FromPacked(packed, n);
+    for (int i = 0; i < n; ++i)
+        for (int j = 0; j <= i; ++j)
+            EXPECT_EQ(triangle(i, j), inverseMatrix(i, j));
+}
+TEST(Cholesky, FactorsAndInverts) {
+    for (const int n : {1, 2, 5, 30}) {
+        ExpectCholesky(RealMatrix(Kind("random"), n, n), n, Cholesky_head, Cholesky_InvMatrix_head,
+                       FullCholesky_head, InvMatrixChoDri_head);
+        ExpectCholesky(ComplexMatrix(Kind("random"), n, n), n, CxCholesky_head,
+                       CxCholesky_InvMatrix_head, CxFullCholesky_head, CxInvMatrixChoDri_head);
+    }
+}
+TEST(Cholesky, RefusesWhatIsNotPositiveDefinite) {
+    ErrorCode err;
+    for (const std::vector<double> &packed :
+         {std::vector<double>{1.0, 2.0, 1.0},
+          {0.0, 0.0, 1.0},
+          {nan, 0.0, 1.0},
+          {1.0, 0.0, 1e-17}}) { // the last one is definite, but counts as singular
+        const DBLArray a(packed);
+        Cholesky_head(a.handle(), &err);
+        EXPECT_EQ(err, ErrNotPositiveDefinite);
+        EXPECT_EQ(a.size(), 0);
+    }
+    const DBLArray scaled(std::vector<double>{1.0, 0.0, 1e-15});
+    Cholesky_head(scaled.handle(), &err);
+    EXPECT_EQ(err, 0);
+    const DBLArray noTriangle(4);
+    Cholesky_head(noTriangle.handle(), &err);
+    EXPECT_EQ(err, ErrNotSquare);
+    const DBLArray zero(std::vector<double>{1.0, 1.0, 0.0});
+    Cholesky_InvMatrix_head(zero.handle(), &err);
+    EXPECT_EQ(err, ErrSingularMatrix);
+}
+TEST(Cholesky, InvertsInTheCallersMemory) {
+    const PositiveDefinite<double> matrix(RealMatrix(Kind("random"), 6, 6), 6);
+    const DBL2DArray a(6, 6, matrix.a), other(6, 6, matrix.a);
+    const DBLArray work(25), tooShort(20);
+    ErrorCode err;
+    PreallocInvMatrixChoDri_H(a.handle(), work.handle(), &err);
+    EXPECT_EQ(err, 0);
+    EXPECT_EQ(work.size(), 25);
+    InvMatrixChoDri_head(other.handle(), &err);
+    EXPECT_EQ(a.values(), other.values());
+    PreallocInvMatrixChoDri_H(other.handle(), tooShort.handle(), &err);
+    EXPECT_EQ(err, ErrSizeMismatch);
+    EXPECT_EQ(tooShort.size(), 20);
+}
+
+template <class T, class Record, class Packed, class Full>
+void ExpectTriangularInverse(const std::vector<T> &b, int n, Packed invertPacked, Full invert) {
+    for (const int32_t triangle : {0, 1}) {
+        std::vector<T> packed, square(b);
+        Exact A(n, n);
+        const Exact B(n, n, b.data());
+        for (int j = 0; j < n; ++j)
+            for (int i = triangle ? 0 : j; i < (triangle ? j + 1 : n); ++i) {
+                packed.push_back(b[i * n + j]);
+                A(i, j) = B(i, j);
+            }
+        auto inverse = Matrix(n, n, square);
+        ErrorCode err;
+        invert(inverse.handle(), &triangle, &err);
+        ASSERT_EQ(err, 0);
+        const Exact X = Contents(inverse);
+        EXPECT_LT((A * X - Exact::Identity(n)).norm(), 4.0L * n * 0x1p-52L * A.norm() * X.norm());
+        auto vector = Vector(packed);
+        Record record = {vector.handle(), triangle};
+        invertPacked(&record, &err);
+        ASSERT_EQ(err, 0);
+        const Exact elements(1, vector.size(), vector.data());
+        int index = 0;
+        for (int j = 0; j < n; ++j)
+            for (int i = 0; i < n; ++i) {
+                const bool inside = triangle ? i <= j : i >= j;
+                EXPECT_EQ(X(i, j), inside ? elements(0, index++) : 0) << i << ' ' << j;
+            }
+    }
+}
+TEST(TriangularInverse, IsTheInverseAndATriangle) {
+    for (const int n : {1, 2, 5, 20})
+        for (const char *kind : {"Frank", "graded"}) {
+            ExpectTriangularInverse<double, PackedTriangle>(
+                RealMatrix(Kind(kind), n, n), n, Tri_InvMatrix_head, InvMatrixTriDri_head);
+            ExpectTriangularInverse<CDB, CxPackedTriangle>(
+                ComplexMatrix(Kind(kind), n, n), n, CxTri_InvMatrix_head, CxInvMatrixTriDri_head);
+        }
+}
+TEST(TriangularInverse, ChecksPivotAndSelector) {
+    ErrorCode err;
+    int32_t triangle = 1;
+    const DBL2DArray negative(2, 2, {-2.0, 1.0, 0.0, -4.0});
+    InvMatrixTriDri_head(negative.handle(), &triangle, &err);
+    EXPECT_EQ(err, 0);
+    EXPECT_EQ(negative.values(), (std::vector<double>{-0.5, -0.125, 0.0, -0.25}));
+    const DBL2DArray small(2, 2, {1.0, 0.0, 0.0, 1e-16});
+    InvMatrixTriDri_head(small.handle(), &triangle, &err);
+    EXPECT_EQ(err, ErrSingularMatrix);
+    triangle = 2;
+    InvMatrixTriDri_head(negative.handle(), &triangle, &err);
+    EXPECT_EQ(err, ErrInvalidSelector);
+    EXPECT_EQ(negative.rows() + negative.cols(), 0);
+}
+
+TEST(QRDecomposition, ExportsFollowTheirSelectors) {
+    const DBL2DArray a(4, 3, RealMatrix(Kind("Frank"), 4, 3));
+    DBL2DArray q, r;
+    I32_2DArray permutation;
+    EXPECT_EQ(QRDecH(a.handle(), 1, 0, permutation.handle(), q.handle(), r.handle()), 0);
+    Exact P(3, 3);
+    for (int i = 0; i < 9; ++i)
+        P(i / 3, i % 3) = permutation[i];
+    EXPECT_LT(Deviation(Contents(q) * Contents(r), Contents(a) * P), 4.0);
+    EXPECT_EQ(QRDecH(a.handle(), 0, 2, permutation.handle(), q.handle(), r.handle()), 0);
+    EXPECT_EQ(permutation.rows() + permutation.cols() + q.rows() + q.cols(), 0);
+    EXPECT_EQ(r.rows(), 3);
+    EXPECT_EQ(QRDecH(a.handle(), 0, 3, permutation.handle(), q.handle(), r.handle()),
+              ErrInvalidSelector);
+    ErrorCode err;
+    for (const int32_t algorithm : {0, 1, 2}) {
+        qrd_head(a.handle(), &algorithm, q.handle(), r.handle(), &err);
+        EXPECT_EQ(err, 0);
+        EXPECT_LT(Deviation(Contents(q) * Contents(r), Contents(a)), 4.0) << algorithm;
+    }
+}
+
+TEST(SingularValueDecomposition, ExportsShapeTheirOutputs) {
+    const std::vector<double> elements = RealMatrix(Kind("random"), 3, 5);
+    const DBL2DArray a(3, 5, elements), inPlace(3, 5, elements);
+    DBL2DArray u, v;
+    DBLArray s, alone;
+    ErrorCode err;
+    EXPECT_EQ(SVDEx_head(a.handle(), 0, u.handle(), s.handle(), v.handle()), 0);
+    EXPECT_EQ(SVD_head(inPlace.handle(), alone.handle(), v.handle(), &err), 0);
+    EXPECT_EQ(err, 0);
+    EXPECT_EQ(inPlace.values(), u.values());
+    EXPECT_EQ(v.rows() * 10 + v.cols(), 53);
+    EXPECT_EQ(alone.values(), s.values());
+    SVDS_head(a.handle(), alone.handle(), &err);
+    EXPECT_EQ(alone.values(), s.values());
+    EXPECT_EQ(SVDEx_head(a.handle(), 1, u.handle(), s.handle(), v.handle()), 0);
+    EXPECT_EQ(v.rows() * 10 + v.cols(), 55);
+}
+
+template <class Array, class Reduce, class Balance, class Back>
+void ExpectBalancedReduction(Array a, Reduce reduce, Balance balance, Back back) {
+    const Exact before = Contents(a);
+    const int n = a.rows();
+    for (const int32_t job : {0, 1, 2, 3}) {
+        Array h = a, q, undone(n, n);
+        DBLArray scale;
+        int32_t low, high;
+        ASSERT_EQ(balance(h.handle(), job, &low, &high, scale.handle()), 0);
+        const Exact balanced = Contents(h);
+        ASSERT_EQ(reduce(h.handle(), low, high, q.handle()), 0);
+        const Exact Q = Contents(q), H = Contents(h);
+        EXPECT_LT(Deviation(Q * H * Q.adjoint(), balanced), 4.0);
+        EXPECT_LT(FromUnitary(Q), 8.0);
+        EXPECT_EQ(H.below(-1), 0.0);
+        // The columns of D P, by which the original matrix is similar to the balanced one.
+        std::vector<typename Array::Value> unit(n * n);
+        for (int i = 0; i < n; ++i)
+            PositiveDefinite<typename Array::Value>::set(unit[i * n + i], 1.0L);
+        Array identity(n, n, unit);
+        Array left = identity;
+        ASSERT_EQ(back(job, 0, low, high, scale.handle(), identity.handle()), 0);
+        ASSERT_EQ(back(job, 1, low, high, scale.handle(), left.handle()), 0);
+        const Exact X = Contents(identity), Y = Contents(left);
+        EXPECT_EQ((Y.adjoint() * X - Exact::Identity(n)).norm(), 0.0L);
+        EXPECT_EQ((before * X - X * balanced).norm(), 0.0L);
+        if (job == 2) {
+            EXPECT_LT(balanced.norm(), 0.01L * before.norm());
+        }
+        if (job == 1) {
+            EXPECT_EQ(low, 2);
+            EXPECT_EQ(high, n - 1);
+        }
+    }
+}
+TEST(Balancing, IsAnExactSimilarityThatReductionAndBackTransformationUnderstand) {
+    // Row 2 and column 4 have nothing but their diagonal element, and the rest is badly scaled.
+    const int n = 7;
+    std::vector<double> a = RealMatrix(Kind("random"), n, n);
+    std::vector<CDB> z = ComplexMatrix(Kind("random"), n, n);
+    for (int i = 0; i < n; ++i)
+        for (int j = 0; j < n; ++j) {
+            const bool isZero = i != j && (i == 2 || j == 4);
+            const double factor = isZero ? 0.0 : std::ldexp(1.0, 6 * (i - j));
+            a[i * n + j] *= factor;
+            z[i * n + j] = {z[i * n + j].re * factor, z[i * n + j].im * factor};
+        }
+    ExpectBalancedReduction(DBL2DArray(n, n, a), Hessenberg_head, MatrixBalance_head,
+                            EigenVBack_head);
+    ExpectBalancedReduction(CDB2DArray(n, n, z), CxHessenberg_head, CxMatrixBalance_head,
+                            CxEigenVBack_head);
+}
+TEST(Balancing, ChecksItsRangeAndEndsOnHugeElements) {
+    const DBL2DArray a(3, 3, std::vector<double>(9, 1.7e308)), v(3, 3);
+    DBL2DArray q;
+    DBLArray scale;
+    int32_t low, high;
+    EXPECT_EQ(MatrixBalance_head(a.handle(), 3, &low, &high, scale.handle()), 0);
+    EXPECT_EQ(low * 10 + high, 13);
+    EXPECT_EQ(Hessenberg_head(v.handle(), 0, 3, q.handle()), ErrIndexOutOfRange);
+    const DBLArray bad(std::vector<double>{4.0, 1.0, 1.0});
+    for (const auto &[job, side, lowest, code] : {std::tuple{1, 0, 2, ErrIndexOutOfRange},
+                                                  {4, 0, 1, ErrInvalidSelector},
+                                                  {1, 2, 1, ErrInvalidSelector},
+                                                  {1, 0, 0, ErrIndexOutOfRange}}) {
+        const DBL2DArray vectors(3, 3);
+        EXPECT_EQ(EigenVBack_head(job, side, lowest, 3, bad.handle(), vectors.handle()), code);
+    }
+}
+
+TEST(Factorisations, RefuseWhatIsNotFinite) {
+    for (const double bad : {nan, inf, -inf, 1.7976931348623157e308}) {
+        const std::vector<double> a = {1.0, bad, 2.0, 3.0};
+        std::vector<double> u(4), s(2), v(4);
+        EXPECT_EQ(qx::SVDecompose(a.data(), 2, 2, u.data(), s.data(), v.data(), 0),
+                  ErrNonFiniteInput);
+        EXPECT_EQ(qx::SingularValues(a.data(), 2, 2, s.data()), ErrNonFiniteInput);
+        EXPECT_EQ(qx::QRDecompose(a.data(), 2, 2, qx::qrFull, u.data(), v.data()),
+                  ErrNonFiniteInput);
+    }
+}
+
+} // namespace
