@@ -143,6 +143,26 @@ TYPED_TEST(Polyphase, BlocksOfAnySizeGiveTheBitsOfOne) {
     }
 }
 
+TEST(Polyphase, IsTheSumOfSciPysUpfirdn) {
+    const std::vector<SciPyCase> cases = SciPyCases("upfirdn");
+    ASSERT_EQ(cases.size(), 6U);
+    for (const SciPyCase &c : cases) {
+        const auto taps = static_cast<int32_t>(c.h.size());
+        // Every mode that can do it; upfirdn goes on behind the end of the input.
+        for (int32_t mode = 0; mode < 4; ++mode) {
+            const Setting setting{mode, c.up, c.down, taps, false};
+            if (setting.up() != c.up || setting.down() != c.down)
+                continue;
+            SCOPED_TRACE(setting);
+            Stream<DBL> stream(setting, c.h, 1.0 / c.up);
+            const Signal y = stream.filter(c.x);
+            ASSERT_EQ(static_cast<int32_t>(y.size()), (40 * c.up - 1) / c.down + 1);
+            for (std::size_t m = 0; m < y.size(); ++m)
+                EXPECT_LE(std::abs(y[m] - c.y[m]), 1e-14L) << m;
+        }
+    }
+}
+
 TEST(Polyphase, AnEmptyStateBeginsAStreamAndAnEmptyBlockChangesNothing) {
     for (const int32_t mode : {Interpolate, Decimate, Rational}) {
         const Setting setting{mode, 3, 2, 12, false};

@@ -118,6 +118,22 @@ TEST(RationalResampling, IsTheDefinitionInBlocksOfAnySize) {
     IsTheDefinitionInBlocksOfAnySize<CDB>();
 }
 
+TEST(RationalResampling, IsSciPysResamplePoly) {
+    const std::vector<SciPyCase> cases = SciPyCases("resample_poly");
+    ASSERT_EQ(cases.size(), 4U);
+    for (const SciPyCase &c : cases) {
+        const Setting setting{c.up, c.down, static_cast<int32_t>(c.h.size()), 0};
+        SCOPED_TRACE(setting);
+        Stream<DBL> stream(setting, c.h);
+        Signal y = stream.resample(c.x);
+        // SciPy's outputs go on to the end, with zeros behind it.
+        Append(y, stream.resample(Signal(40)));
+        ASSERT_GE(y.size(), c.y.size());
+        for (std::size_t m = 0; m < c.y.size(); ++m)
+            EXPECT_LE(std::abs(y[m] - c.y[m]), 1e-13L) << m;
+    }
+}
+
 TEST(RationalResampling, ChannelsAreStreamsThatShareTheirPositions) {
     const Setting setting{3, 2, 23, 4};
     const Signal h = NoiseSignal(23, 3, false);

@@ -3,9 +3,12 @@
 
 #include "tests/support/hostile_host.h"
 #include "tests/support/recipe.h"
+#include "tests/support/test_data.h"
 
 #include <complex>
-#include <cstring>
+#include <cstdlib>
+#include <fstream>
+#include <string>
 #include <vector>
 
 namespace qx::test {
@@ -70,6 +73,28 @@ inline std::vector<int32_t> RandomBlocks(int32_t n, uint64_t seed) {
         blocks.push_back(std::min(left, sizes[noise.bits() % std::size(sizes)]));
     blocks.push_back(0);
     return blocks;
+}
+
+// What make_scipy_rates.py has written for a function of scipy.signal.
+struct SciPyCase {
+    int32_t up, down;
+    Signal x, h, y;
+};
+inline std::vector<SciPyCase> SciPyCases(const std::string &function) {
+    std::vector<SciPyCase> cases;
+    std::ifstream file(TestData("scipy_rates.dat"));
+    for (std::string name; file >> name;) {
+        SciPyCase c;
+        std::size_t sizes[3];
+        file >> c.up >> c.down >> sizes[0] >> sizes[1] >> sizes[2];
+        Signal *parts[] = {&c.x, &c.h, &c.y};
+        for (int part = 0; part < 3; ++part)
+            for (std::string number; parts[part]->size() < sizes[part] && file >> number;)
+                parts[part]->emplace_back(std::strtod(number.c_str(), nullptr));
+        if (name == function)
+            cases.push_back(c);
+    }
+    return cases;
 }
 
 // u[i], and 0 outside.
