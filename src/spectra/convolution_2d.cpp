@@ -60,26 +60,25 @@ struct ComplexParts {
     }
 };
 
-// Row by row of the result: one sliding sum per row of the kernel, each going on from the last.
+// Row by row of the result: a sliding sum over the rows of the kernel that reach it.
 template <ElementType Code>
 void ConvolveDirectly2D(const Matrix<Code> &big, const Matrix<Code> &kernel,
                         typename Element<Code>::type *out) {
-    typedef typename Element<Code>::type T;
     const std::ptrdiff_t rows = std::ptrdiff_t{big.rows} + kernel.rows - 1;
     const std::ptrdiff_t cols = std::ptrdiff_t{big.cols} + kernel.cols - 1;
     for (std::ptrdiff_t r = 0; r < rows; ++r) {
-        T *const outRow = out + r * cols;
         const std::ptrdiff_t low = std::max<std::ptrdiff_t>(0, r - big.rows + 1);
         const std::ptrdiff_t high = std::min<std::ptrdiff_t>(kernel.rows - 1, r);
-        for (std::ptrdiff_t i = low; i <= high; ++i)
-            SlidingSums({{kernel.row(i)},
-                         kernel.cols,
-                         {big.row(r - i) + (big.cols - 1), -1},
-                         big.cols,
-                         1 - int64_t{kernel.cols},
-                         {outRow + (cols - 1), -1},
-                         static_cast<int32_t>(cols),
-                         i > low});
+        SlidingSums({{kernel.row(low)},
+                     kernel.cols,
+                     {big.row(r - low) + (big.cols - 1), -1},
+                     big.cols,
+                     1 - int64_t{kernel.cols},
+                     {out + r * cols + (cols - 1), -1},
+                     static_cast<int32_t>(cols),
+                     static_cast<int32_t>(high - low + 1),
+                     kernel.cols,
+                     -std::ptrdiff_t{big.cols}});
     }
 }
 

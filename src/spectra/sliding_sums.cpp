@@ -23,8 +23,9 @@ CDB Term(const CDB &sum, const CDB &a, const CDB &b) {
 template <ElementType Code>
 bool AllTapsFinite(const SlidingJob<Code> &job) {
     bool finite = true;
-    for (std::ptrdiff_t k = 0; k < job.tapCount; ++k)
-        finite &= IsFinite(job.taps.at[k * job.taps.step]);
+    for (std::ptrdiff_t i = 0; i < job.segments; ++i)
+        for (std::ptrdiff_t k = 0; k < job.tapCount; ++k)
+            finite &= IsFinite(job.taps.at[i * job.tapSegment + k * job.taps.step]);
     return finite;
 }
 
@@ -33,12 +34,15 @@ template <ElementType Code>
 void OneByOne(const SlidingJob<Code> &job) {
     for (std::ptrdiff_t t = job.count - 1; t >= 0; --t) {
         const int64_t start = job.first + t;
-        const int64_t low = std::max<int64_t>(0, -start);
-        const int64_t high = std::min<int64_t>(job.tapCount, job.length - start);
-        auto sum = job.continues ? job.out.at[t * job.out.step] : typename Element<Code>::type{};
-        for (int64_t k = low; k < high; ++k)
-            sum = Term(sum, job.taps.at[static_cast<std::ptrdiff_t>(k) * job.taps.step],
-                       job.signal.at[static_cast<std::ptrdiff_t>(start + k) * job.signal.step]);
+        const auto low = static_cast<std::ptrdiff_t>(std::max<int64_t>(0, -start));
+        const auto high =
+            static_cast<std::ptrdiff_t>(std::min<int64_t>(job.tapCount, job.length - start));
+        typename Element<Code>::type sum = {};
+        for (std::ptrdiff_t i = 0; i < job.segments; ++i)
+            for (std::ptrdiff_t k = low; k < high; ++k)
+                sum = Term(sum, job.taps.at[i * job.tapSegment + k * job.taps.step],
+                           job.signal.at[i * job.signalSegment +
+                                         static_cast<std::ptrdiff_t>(start + k) * job.signal.step]);
         job.out.at[t * job.out.step] = sum;
     }
 }

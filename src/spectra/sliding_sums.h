@@ -16,7 +16,8 @@ namespace qx {
 //
 // with the terms added in this order. Taps, signal and output each have a step, which may be
 // negative; an order of summation that walks the other way is a matter of steps. Terms beyond the
-// ends of the signal are left out. The output may lie on the signal if none of the windows that
+// ends of the signal are left out. A job of several segments adds the sums over rows of taps and of
+// signals, one row after the other. The output may lie on the signal if none of the windows that
 // begin at t or before holds the place of out[t], its own last value excepted.
 //
 // A complex term a b adds (a.re b.re - a.im b.im) to the real sum and (a.im b.re + a.re b.im) to
@@ -42,7 +43,8 @@ struct SlidingJob {
     int64_t first;
     Steps<Code> out;
     int32_t count;
-    bool continues = false; // the sums go on from what stands in the output
+    int32_t segments = 1;
+    std::ptrdiff_t tapSegment = 0, signalSegment = 0; // from one row to the next
 };
 
 void SlidingSums(const SlidingJob<ElementType::DBL> &job);

@@ -78,53 +78,68 @@ inline void StoreSome(L values, DBL *at, std::ptrdiff_t step, std::ptrdiff_t i) 
         values.reversed().store(at - i - (lanes - 1));
 }
 
-// The first of `count` vectors whose lane l begins at signal[begin + l stretch], as far as a square
-// at a time serves; their number.
-inline int LayOutSquares(const SlidingJob<ElementType::DBL> &job, int64_t begin, int stretch,
-                         int count, double *vectors) {
-    const bool within = begin >= 0 && begin + int64_t{stretch} * (lanes - 1) + count <= job.length;
-    if (!within || (job.signal.step != 1 && job.signal.step != -1))
-        return 0;
-    int i = 0;
-    for (; i + lanes <= count; i += lanes) {
+// A stretch of signal to be laid out: lane l begins at index begin + l stretch.
+template <ElementType Code>
+struct Rows {
+    const typename Element<Code>::type *signal;
+    std::ptrdiff_t step;
+    int64_t length, begin;
+    int stretch;
+};
+
+// Where the vectors begin and end that squares can lay out: all lanes lie on the signal.
+struct Range {
+    int from, to;
+};
+inline Range SquaresOf(const Rows<ElementType::DBL> &rows, int count) {
+    const int64_t low = rows.begin < 0 ? -rows.begin : 0;
+    const int64_t high = rows.length - rows.begin - int64_t{rows.stretch} * (lanes - 1);
+    const int64_t end = high < count ? high : count;
+    if ((rows.step != 1 && rows.step != -1) || end - low < lanes)
+        return {0, 0};
+    const int from = static_cast<int>(low);
+    return {from, from + static_cast<int>(end - low) / lanes * lanes};
+}
+inline Range SquaresOf(const Rows<ElementType::CDB> &, int) { return {0, 0}; }
+
+inline void LayOutSquares(const Rows<ElementType::DBL> &rows, Range range, double *vectors) {
+    for (int i = range.from; i < range.to; i += lanes) {
         L square[lanes];
         for (int lane = 0; lane < lanes; ++lane)
-            square[lane] =
-                LoadSome(job.signal.at, job.signal.step,
-                         static_cast<std::ptrdiff_t>(begin + int64_t{lane} * stretch + i));
+            square[lane] = LoadSome(
+                rows.signal, rows.step,
+                static_cast<std::ptrdiff_t>(rows.begin + int64_t{lane} * rows.stretch + i));
         Transpose(square);
         for (int lane = 0; lane < lanes; ++lane)
             square[lane].store(vectors + (i + lane) * lanes);
     }
-    return i;
 }
-inline int LayOutSquares(const SlidingJob<ElementType::CDB> &, int64_t, int, int, double *) {
-    return 0;
-}
+inline void LayOutSquares(const Rows<ElementType::CDB> &, Range, double *) {}
 
-// Lays out `count` vectors whose lane l begins at signal[start + l stretch].
 template <class Sums>
-void LayOut(const SlidingJob<Sums::code> &job, int64_t start, int stretch, int count,
-            double *vectors) {
+void LayOutOneByOne(const Rows<Sums::code> &rows, Range range, double *vectors) {
     typedef typename Element<Sums::code>::type T;
     const T zero = {};
-    const int done = LayOutSquares(job, start, stretch, count, vectors);
     for (int lane = 0; lane < lanes; ++lane) {
-        const int64_t begin = start + int64_t{lane} * stretch;
-        const int64_t before = begin < 0 ? -begin : 0;
-        const int64_t left = job.length - begin;
-        const int low = static_cast<int>(before < count ? before : count);
-        const int high = static_cast<int>(left < low ? low : left < count ? left : count);
+        const int64_t begin = rows.begin + int64_t{lane} * rows.stretch;
         double *const place = vectors + lane;
-        int i = done;
-        for (; i < low; ++i)
-            Put(place + i * Sums::parts * lanes, &zero);
-        const T *value = job.signal.at + static_cast<std::ptrdiff_t>(begin + i) * job.signal.step;
-        for (; i < high; ++i, value += job.signal.step)
+        for (int i = range.from; i < range.to; ++i) {
+            const int64_t at = begin + i;
+            const T *const value = at < 0 || at >= rows.length
+                                       ? &zero
+                                       : rows.signal + static_cast<std::ptrdiff_t>(at) * rows.step;
             Put(place + i * Sums::parts * lanes, value);
-        for (; i < count; ++i)
-            Put(place + i * Sums::parts * lanes, &zero);
+        }
     }
+}
+
+// Lays out `count` vectors.
+template <class Sums>
+void LayOut(const Rows<Sums::code> &rows, int count, double *vectors) {
+    const Range squares = SquaresOf(rows, count);
+    LayOutOneByOne<Sums>(rows, {0, squares.from}, vectors);
+    LayOutSquares(rows, squares, vectors);
+    LayOutOneByOne<Sums>(rows, {squares.to, count}, vectors);
 }
 
 // `together` sums of each lane over all taps of the tile.
@@ -182,17 +197,6 @@ inline void SumTaps(ComplexSums, const double *vectors, const double *tap, int t
     }
 }
 
-template <class Sums>
-void StartSums(const SlidingJob<Sums::code> &job, int64_t start, int stretch, int64_t count,
-               double *sums) {
-    for (int i = 0; i < stretch * Sums::parts * lanes; ++i)
-        sums[i] = 0.0;
-    if (job.continues)
-        for (int64_t t = 0; t < count; ++t)
-            Put(sums + t % stretch * Sums::parts * lanes + t / stretch,
-                job.out.at + static_cast<std::ptrdiff_t>(start + t) * job.out.step);
-}
-
 inline int StoreSquares(const SlidingJob<ElementType::DBL> &job, int64_t start, int stretch,
                         int64_t count, const double *sums) {
     if (count < int64_t{stretch} * lanes || (job.out.step != 1 && job.out.step != -1))
@@ -228,25 +232,35 @@ void StoreSums(const SlidingJob<Sums::code> &job, int64_t start, int stretch, in
     }
 }
 
+// The taps from `tap` on that one tile takes, all of one row.
+template <class Sums>
+void AddTaps(const SlidingJob<Sums::code> &job, std::ptrdiff_t row, int32_t tap, int taps,
+             int64_t start, int stretch, Tile<Sums> &tile) {
+    const Rows<Sums::code> rows = {job.signal.at + row * job.signalSegment, job.signal.step,
+                                   job.length, job.first + start + tap, stretch};
+    LayOut<Sums>(rows, stretch + taps, tile.signal);
+    const typename Element<Sums::code>::type *const first =
+        job.taps.at + row * job.tapSegment + std::ptrdiff_t{tap} * job.taps.step;
+    for (int k = 0; k < taps; ++k)
+        __builtin_memcpy(tile.tap + k * Sums::parts, first + k * job.taps.step, sizeof *first);
+    for (int p = 0; p < stretch; p += Sums::together)
+        SumTaps(Sums(), tile.signal + p * Sums::parts * lanes, tile.tap, taps,
+                tile.sums + p * Sums::parts * lanes);
+}
+
 // Outputs start .. start + count - 1, at most those of one tile.
 template <class Sums>
 void RunTile(const SlidingJob<Sums::code> &job, int64_t start, int64_t count, Tile<Sums> &tile) {
     const int needed = static_cast<int>((count + lanes - 1) / lanes);
     const int stretch = (needed + Sums::together - 1) / Sums::together * Sums::together;
-    StartSums<Sums>(job, start, stretch, count, tile.sums);
-    for (int32_t tap = 0; tap < job.tapCount; tap += Tile<Sums>::taps) {
-        const int left = job.tapCount - tap;
-        const int taps = left < Tile<Sums>::taps ? left : Tile<Sums>::taps;
-        LayOut<Sums>(job, job.first + start + tap, stretch, stretch + taps, tile.signal);
-        for (int k = 0; k < taps; ++k) {
-            const typename Element<Sums::code>::type *value =
-                job.taps.at + (std::ptrdiff_t{tap} + k) * job.taps.step;
-            __builtin_memcpy(tile.tap + k * Sums::parts, value, sizeof *value);
+    for (int i = 0; i < stretch * Sums::parts * lanes; ++i)
+        tile.sums[i] = 0.0;
+    for (std::ptrdiff_t row = 0; row < job.segments; ++row)
+        for (int32_t tap = 0; tap < job.tapCount; tap += Tile<Sums>::taps) {
+            const int left = job.tapCount - tap;
+            AddTaps<Sums>(job, row, tap, left < Tile<Sums>::taps ? left : Tile<Sums>::taps, start,
+                          stretch, tile);
         }
-        for (int p = 0; p < stretch; p += Sums::together)
-            SumTaps(Sums(), tile.signal + p * Sums::parts * lanes, tile.tap, taps,
-                    tile.sums + p * Sums::parts * lanes);
-    }
     StoreSums<Sums>(job, start, stretch, count, tile.sums);
 }
 
