@@ -149,7 +149,12 @@ class Refusing(unittest.TestCase):
         "is an input": "\n/** A. */ QX_API void f(QX_OUT double x);",
         "const exactly": "\n/** A. */ QX_API void f(QX_IN DBL *x);",
         "const exactly if": "\n/** A. */ QX_API void f(QX_OUT const DBL *x);",
-        "must be the last": "\n/** Codes: none. */ QX_API void f(QX_OUT ErrorCode *err, int32_t n);",
+        "two error out-parameters":
+            "\n/** Codes: none. */ QX_API void f(QX_OUT ErrorCode *err, QX_OUT ErrorCode *again);",
+        "the length of x is no int32_t":
+            "\n/** Codes: none. */ QX_API void f(double n, QX_INOUT QX_LENGTH(n) DBL *x);",
+        "belongs to a pointer":
+            "\n/** Codes: none. */ QX_API void f(int32_t n, QX_INOUT QX_LENGTH(n) DBL1D x);",
         "out-parameter must be QX_OUT": "\n/** A. */ QX_API void f(QX_INOUT ErrorCode *err);",
         "word must be QX_INOUT":
             "\ntypedef void *PlanSlot; /** A. */ QX_API void f(QX_IN PlanSlot *slot);",

@@ -205,6 +205,9 @@ def argument_of(words, types):
     text = spelled(words)
     direction = DIRECTIONS.get(words[0])
     words = words[1:] if direction else words
+    length = None
+    if words[:2] == ["QX_LENGTH", "("] and words[3:4] == [")"]:
+        length, words = words[2], words[4:]
     if any(word in DIRECTIONS for word in words):
         raise ValueError(f"argument '{text}': a direction mark stands first and once")
     if len(words) < 2 or not re.fullmatch(r"[A-Za-z_]\w*", words[-1]):
@@ -243,6 +246,8 @@ def argument_of(words, types):
         argument.update(kind="error", element="I32")
         if direction != "out":
             raise ValueError(f"argument '{text}': an error out-parameter must be QX_OUT")
+    elif stars == 1 and base in SCALARS and length:
+        argument.update(kind="buffer", element=SCALARS[base], length=length)
     elif stars == 1 and base in SCALARS:
         argument["kind"] = {"in": "reference", "out": "output", "inout": "inout"}.get(direction)
         argument["element"] = SCALARS[base]
@@ -252,7 +257,9 @@ def argument_of(words, types):
         raise ValueError(f"argument '{text}': unknown type {spelled(kind_words)}")
     if direction is None:
         raise ValueError(f"argument '{text}': QX_IN, QX_OUT or QX_INOUT is missing")
-    if argument["kind"] in ("reference", "output", "inout", "record"):
+    if length and argument["kind"] != "buffer":
+        raise ValueError(f"argument '{text}': QX_LENGTH belongs to a pointer to elements")
+    if argument["kind"] in ("reference", "output", "inout", "record", "buffer"):
         if constant != (direction == "in"):
             raise ValueError(f"argument '{text}': a pointer is const exactly if it is QX_IN")
     return argument
@@ -374,8 +381,12 @@ def export_of(path, statement, types, codes):
             fail(f"{name}: {error}")
         if [a["name"] for a in arguments].count(arguments[-1]["name"]) > 1:
             fail(f"{name}: two arguments are called {arguments[-1]['name']}")
-    if any(a["kind"] == "error" for a in arguments[:-1]):
-        fail(f"{name}: an error out-parameter must be the last argument")
+    if [a["kind"] for a in arguments].count("error") > 1:
+        fail(f"{name}: two error out-parameters")
+    counts = {a["name"] for a in arguments if a["kind"] == "value" and a["element"] == "I32"}
+    for argument in arguments:
+        if argument.get("length", None) not in counts | {None}:
+            fail(f"{name}: the length of {argument['name']} is no int32_t argument")
     return {
         "name": name, "family": path.stem, "header": f"qx/{path.name}", "line": statement.line,
         "returns": spelled(returns), "declaration": spelled(words).replace(" ,", ",")

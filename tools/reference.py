@@ -40,7 +40,7 @@ ul.index { columns: 3; padding-left: 1.2em; font-size: .92em; }
 KINDS = {"array1d": "array of {}", "array2d": "matrix of {}", "value": "{}",
          "reference": "{} by reference", "output": "{}", "inout": "{}", "error": "code",
          "record": "record {}", "slot": "plan slot", "instance": "instance data",
-         "opaque": "pointer", "procedure": "procedure"}
+         "opaque": "pointer", "buffer": "pointer to {}", "procedure": "procedure"}
 
 
 def marked(text):

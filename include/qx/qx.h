@@ -15,6 +15,7 @@
 #include "qx/frame.h"
 #include "qx/matrix_factorisations.h"
 #include "qx/matrix_products.h"
+#include "qx/noise.h"
 #include "qx/polyphase.h"
 #include "qx/rational_resampling.h"
 #include "qx/resampling.h"
@@ -23,6 +24,7 @@
 #include "qx/stats.h"
 #include "qx/transforms.h"
 #include "qx/types.h"
+#include "qx/waveforms.h"
 #include "qx/windows.h"
 #include "qx/zero_phase.h"
 

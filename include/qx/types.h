@@ -27,6 +27,8 @@
 #define QX_IN
 #define QX_OUT
 #define QX_INOUT
+/* Behind the direction of a pointer to elements: the argument that counts them. */
+#define QX_LENGTH(count)
 
 QX_BEGIN_DECLS
 

@@ -124,7 +124,7 @@ class Export:
         self.given = [a for a in self.arguments if self._is_given(a)]
         self.taken = [a for a in self.arguments
                       if a["direction"] != "in" and a["kind"] not in ("slot", "instance", "error")]
-        self.has_error = bool(self.arguments) and self.arguments[-1]["kind"] == "error"
+        self.has_error = any(a["kind"] == "error" for a in self.arguments)
         self.has_plan = any(a["kind"] in ("slot", "instance") for a in self.arguments)
         self.names = [a["name"] + "_" * keyword.iskeyword(a["name"]) for a in self.given]
         self.gives_value = not self.taken and not self.has_error and (
@@ -173,6 +173,7 @@ class Export:
 
     def _called(self, values):
         lengths = tuple(map(self._length, self.given, values)) if self.has_plan else ()
+        self._check_buffers(values)
         values = iter(values)
         c_arguments, kept = [], []
         for argument in self.arguments:
@@ -182,6 +183,15 @@ class Export:
             kept.append(keep)
         result = self.function(*c_arguments)
         return self._finish(result, kept)
+
+    def _check_buffers(self, values):
+        """A plain pointer has no length of its own, so the count is held against the array."""
+        for argument, value in zip(self.given, values):
+            if argument["kind"] == "buffer":
+                count = values[[a["name"] for a in self.given].index(argument["length"])]
+                if np.size(value) < count:
+                    raise ValueError(f"{argument['name']}: {count} elements are needed, not "
+                                     f"{np.size(value)}")
 
     def _prepare(self, argument, value, lengths):
         """What the function is given, and what is kept to read results from."""
@@ -210,6 +220,10 @@ class Export:
         if kind == "record":
             record = Record(element, value or {}, name)
             return ctypes.byref(record.record), record
+        if kind == "buffer":
+            array = np.array(arrays.checked(value, arrays.element_dtype(element), 1, name),
+                             arrays.element_dtype(element))
+            return ctypes.c_void_p(array.ctypes.data), array
         if kind == "opaque":
             pointer = ctypes.c_void_p(value)
             return (ctypes.byref(pointer) if argument["direction"] == "out" else pointer), pointer
@@ -226,9 +240,12 @@ class Export:
                 results.append(keep.contents())
             elif argument["kind"] == "opaque":
                 results.append(keep.value)
+            elif argument["kind"] == "buffer":
+                results.append(keep)
             else:
                 results.append(plain(keep, argument["element"]))
-        status = kept[-1].value if self.has_error else 0
+        status = next((keep.value for argument, keep in zip(self.arguments, kept)
+                       if argument["kind"] == "error"), 0)
         if status == 0 and (self.has_error or self.entry["returns"] == "ErrorCode"):
             status = result or 0
         if status < 0 or status in HOST_FAILURES:

@@ -175,6 +175,15 @@ int32_t InErrWithHost(ErrorCode *err, Body body, Arguments &&...arguments) {
     return outcome.isHosts() ? outcome.raw() : 0;
 }
 
+// The code is in *err and is the function result too, where the host's own status takes its place
+// if the host refused a resize.
+template <class Body, class... Arguments>
+int32_t InErrAndReturnedWithHost(ErrorCode *err, Body body, Arguments &&...arguments) {
+    const Outcome outcome = detail::RunFrame(body, std::forward<Arguments>(arguments)...);
+    *err = outcome.code();
+    return outcome.raw();
+}
+
 } // namespace qx
 
 #endif

@@ -257,7 +257,8 @@ enum Quirk : unsigned {
     // The code stands in *err, and the function result is the host's own status where the host
     // refused a resize (else 0, as for all others with an error out-parameter).
     HostStatusInResult = 128,
-    // The code stands in *err and is the function result as well.
+    // The code stands in *err and is the function result as well; with HostStatusInResult the
+    // host's own status takes its place there.
     CodeInBoth = 256,
     // A refused resize is a success.
     RefusalPasses = 512,

@@ -1,0 +1,1 @@
+qx_bench(signal SOURCES signal.cpp)
