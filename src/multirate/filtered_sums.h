@@ -162,9 +162,24 @@ private:
         for (int32_t r = 0; r < count; ++r)
             rows[r] = rowOf(sumOf(m + r), sums_.data() + r * width);
         sum(rows, count, width);
-        for (int32_t r = 0; r < count; ++r)
-            for (int32_t s = 0; s < periods; ++s)
-                y[int64_t{s} * rhythm_.period + r] = reinterpret_cast<const T *>(rows[r].sums)[s];
+        if (rhythm_.period == 2)
+            interleave<2>(width, periods, y);
+        else if (rhythm_.period == 3)
+            interleave<3>(width, periods, y);
+        else
+            for (int32_t r = 0; r < count; ++r)
+                for (int32_t s = 0; s < periods; ++s)
+                    y[int64_t{s} * rhythm_.period + r] =
+                        reinterpret_cast<const T *>(rows[r].sums)[s];
+    }
+    // Whole short periods: known to the compiler, this becomes shuffles.
+    template <int Period>
+    void interleave(int32_t width, int32_t periods, T *y) const {
+        const T *sums = reinterpret_cast<const T *>(sums_.data());
+        const int32_t pitch = width / parts;
+        for (int64_t s = 0; s < periods; ++s)
+            for (int r = 0; r < Period; ++r)
+                y[s * Period + r] = sums[r * pitch + s];
     }
 
     const Samples<Code> samples_;

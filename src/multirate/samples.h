@@ -76,8 +76,13 @@ struct Samples {
             CopySamples<Code>(to + i, block + (first - keptCount), number - i);
         } else {
             const T *from = block + (first - keptCount);
-            for (int64_t k = 0; k < number - i; ++k)
-                to[i + k] = from[k * stride];
+            const int64_t left = number - i;
+            if (stride == 2) // known to the compiler, this becomes shuffles
+                for (int64_t k = 0; k < left; ++k)
+                    to[i + k] = from[2 * k];
+            else
+                for (int64_t k = 0; k < left; ++k)
+                    to[i + k] = from[k * stride];
         }
     }
 
