@@ -14,9 +14,10 @@ namespace {
 constexpr auto Real = ElementType::DBL;
 constexpr auto Complex = ElementType::CDB;
 
-template <class T>
-void Copy(const T *from, std::ptrdiff_t count, T *to) {
-    std::memcpy(static_cast<void *>(to), from, sizeof(T) * static_cast<std::size_t>(count));
+template <ElementType Code>
+void Copy(const typename Element<Code>::type *from, std::ptrdiff_t count,
+          typename Element<Code>::type *to) {
+    std::memcpy(static_cast<void *>(to), from, sizeof *to * static_cast<std::size_t>(count));
 }
 
 // y[t] = sum over k of b[nb-1-k] x[t+k], the real and the imaginary parts apart where either the
@@ -84,13 +85,13 @@ ErrorCode Sums(const typename DirectForm<C, X>::C *b, int32_t nb,
         return failed;
     typename DirectForm<C, X>::X *const joined = memory.data();
     typename DirectForm<C, X>::X *const newest = joined + (past + head);
-    Copy(state, past, joined);
-    Copy(x, head, joined + past);
-    Copy(n > past ? x + (n - past) : joined + n, past, newest);
+    Copy<X>(state, past, joined);
+    Copy<X>(x, head, joined + past);
+    Copy<X>(n > past ? x + (n - past) : joined + n, past, newest);
     if (n > past)
         Slide(taps, nb, x, n, y + past, static_cast<int32_t>(n - past));
     Slide(taps, nb, joined, past + head, y, static_cast<int32_t>(head));
-    Copy(newest, past, state);
+    Copy<X>(newest, past, state);
     return memory.release();
 }
 

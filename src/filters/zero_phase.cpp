@@ -70,9 +70,13 @@ ErrorCode ZeroPhaseCascade(const CascadeCoefficients &filter, DBL *forward, DBL 
     const int64_t pad = std::max(ResponseLength(filter.a + (order - 1), order, base),
                                  ResponseLength(filter.b + order, order, base)) +
                         1;
-    return ThereAndBack(x, n, pad, forward, backward, [&](DBL *values, int32_t count, DBL *state) {
-        return FilterIIRCascade(filter, state, filter.aCount, values, count);
-    });
+    struct State {
+        DBL *values;
+    };
+    return ThereAndBack(
+        x, n, pad, State{forward}, State{backward}, [&](DBL *values, int32_t count, State state) {
+            return FilterIIRCascade(filter, state.values, filter.aCount, values, count);
+        });
 }
 
 } // namespace qx

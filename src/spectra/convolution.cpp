@@ -19,11 +19,12 @@ constexpr auto Complex = ElementType::CDB;
 const CDB *Elements(const DBL *interleaved) { return reinterpret_cast<const CDB *>(interleaved); }
 CDB *Elements(DBL *interleaved) { return reinterpret_cast<CDB *>(interleaved); }
 
-template <class T>
-void CopyPadded(const T *from, std::ptrdiff_t count, T *to, std::ptrdiff_t length) {
-    std::memcpy(to, from, sizeof(T) * static_cast<std::size_t>(count));
+template <ElementType Code>
+void CopyPadded(const typename Element<Code>::type *from, std::ptrdiff_t count,
+                typename Element<Code>::type *to, std::ptrdiff_t length) {
+    std::memcpy(to, from, sizeof *to * static_cast<std::size_t>(count));
     std::memset(static_cast<void *>(to + count), 0,
-                sizeof(T) * static_cast<std::size_t>(length - count));
+                sizeof *to * static_cast<std::size_t>(length - count));
 }
 
 // out[t] = sum of a[i] b[t - i]. The shorter sequence are the taps; the steps let their order be
@@ -75,10 +76,10 @@ ErrorCode TransformReal(const DBL *x, int32_t nx, bool reversed, const DBL *y, i
         return ErrOutOfMemory;
     DBL *const a = memory.data();
     DBL *const b = a + L;
-    CopyPadded(x, nx, a, L);
+    CopyPadded<Real>(x, nx, a, L);
     if (reversed)
         Reverse(a, nx);
-    CopyPadded(y, ny, b, L);
+    CopyPadded<Real>(y, ny, b, L);
     if (const ErrorCode failed = ConvolveCircularly(plan.get(), L, a, b, b + L))
         return failed;
     std::memcpy(out, a, sizeof(DBL) * static_cast<std::size_t>(count));
@@ -100,8 +101,8 @@ ErrorCode TransformComplex(const DBL *x, int32_t nx, const DBL *y, int32_t ny, D
     const auto forward = [&](const CDB *from, CDB *to) {
         return FFTComplexForward(plan.get(), &from->re, &from->im, &to->re, &to->im, 2, 2, L);
     };
-    CopyPadded(Elements(x), nx, b, L);
-    CopyPadded(Elements(y), ny, c, L);
+    CopyPadded<Complex>(Elements(x), nx, b, L);
+    CopyPadded<Complex>(Elements(y), ny, c, L);
     if (const ErrorCode failed = forward(b, a))
         return failed;
     if (const ErrorCode failed = forward(c, b))
@@ -125,7 +126,7 @@ ErrorCode AutoCorrelateByTransform(const DBL *x, int32_t n, DBL *out) {
         return ErrOutOfMemory;
     DBL *const a = memory.data();
     DBL *const b = a + L;
-    CopyPadded(x, n, a, L);
+    CopyPadded<Real>(x, n, a, L);
     if (const ErrorCode failed = FFTRealForward(plan.get(), a, b, 1, 1, L))
         return failed;
     SquareHalfComplex(b, L, a);
@@ -143,8 +144,9 @@ void Divide(CDB *value, double divisor) {
     value->im = value->im / divisor;
 }
 
-template <class T>
-ErrorCode Normalize(T *out, int32_t nx, int32_t ny, int32_t normalization) {
+template <ElementType Code>
+ErrorCode Normalize(typename Element<Code>::type *out, int32_t nx, int32_t ny,
+                    int32_t normalization) {
     const int32_t m = std::min(nx, ny);
     const int32_t M = std::max(nx, ny);
     const std::ptrdiff_t count = std::ptrdiff_t{m} + M - 1;
@@ -219,7 +221,7 @@ ErrorCode CorrelateReal(const DBL *x, int32_t nx, const DBL *y, int32_t ny, int3
     else if (algorithm == ConvolveByTransform)
         status = x == y && nx == ny ? AutoCorrelateByTransform(x, nx, out)
                                     : TransformReal(x, nx, true, y, ny, out);
-    return status != 0 ? status : Normalize(out, nx, ny, normalization);
+    return status != 0 ? status : Normalize<Real>(out, nx, ny, normalization);
 }
 
 ErrorCode CorrelateComplex(const DBL *x, int32_t nx, const DBL *y, int32_t ny, DBL *out,
@@ -235,7 +237,7 @@ ErrorCode CorrelateComplex(const DBL *x, int32_t nx, const DBL *y, int32_t ny, D
     }
     ErrorCode status = ConvolveComplex(&reversed.data()->re, nx, y, ny, out, algorithm);
     status = Merge(status, reversed.release());
-    return status != 0 ? status : Normalize(Elements(out), nx, ny, normalization);
+    return status != 0 ? status : Normalize<Complex>(Elements(out), nx, ny, normalization);
 }
 
 } // namespace qx

@@ -73,12 +73,11 @@ ErrorCode CheckSpiral(const CDB &a, const CDB &w) {
 }
 
 // terms[k] = x[k] a^(-k), from one power and a product for each further value.
-template <class T>
-void TakeStart(const T *x, std::ptrdiff_t n, const CDB &a, CDB *terms) {
+template <ElementType Code>
+void TakeStart(const typename Element<Code>::type *x, std::ptrdiff_t n, const CDB &a, CDB *terms) {
     CDB factor = Powers(a).of(static_cast<double>(1 - n));
     for (std::ptrdiff_t k = n - 1; k >= 0; --k) {
-        const T value = x[k];
-        terms[k] = Product(value, factor);
+        terms[k] = Product(x[k], factor);
         factor = Product(factor, a);
     }
 }
@@ -124,15 +123,15 @@ ErrorCode SumByConvolution(CDB *terms, int32_t n, const CDB &w, CDB *out, int32_
     return memory.release();
 }
 
-template <class T>
-ErrorCode Transform(const T *x, int32_t n, const CDB &a, const CDB &w, uint32_t method, CDB *out,
-                    int32_t count) {
+template <ElementType Code>
+ErrorCode Transform(const typename Element<Code>::type *x, int32_t n, const CDB &a, const CDB &w,
+                    uint32_t method, CDB *out, int32_t count) {
     if (const ErrorCode failed = CheckSpiral(a, w))
         return failed;
     Work terms;
     if (const ErrorCode failed = terms.allocate(n))
         return failed;
-    TakeStart(x, n, a, terms.data());
+    TakeStart<Code>(x, n, a, terms.data());
     if (method == Bluestein)
         return SumByConvolution(terms.data(), n, w, out, count);
     SumDirectly(terms.data(), n, w, out, count);
@@ -247,10 +246,10 @@ ErrorCode Interpolate(const CDB *values, int32_t n, const CDB &w, CDB *work, CDB
 } // namespace
 
 ErrorCode ChirpZ(const DBL *x, int32_t n, CDB a, CDB w, uint32_t method, CDB *out, int32_t count) {
-    return Transform(x, n, a, w, method, out, count);
+    return Transform<ElementType::DBL>(x, n, a, w, method, out, count);
 }
 ErrorCode ChirpZ(const CDB *x, int32_t n, CDB a, CDB w, uint32_t method, CDB *out, int32_t count) {
-    return Transform(x, n, a, w, method, out, count);
+    return Transform<ElementType::CDB>(x, n, a, w, method, out, count);
 }
 
 ErrorCode InverseChirpZ(const CDB *in, int32_t n, CDB a, CDB w, CDB *out, int32_t count) {

@@ -58,16 +58,20 @@ Path CascadePath(bool hasA, bool hasB) {
     return hasA || hasB ? Path::Missing : Path::Nothing;
 }
 
-template <class Coefficients, class X, class Y>
-ErrorCode RunDirect(Path path, const In<Coefficients> &a, const In<Coefficients> &b, X *xState,
-                    Y *yState, const X *x, int32_t n, Y *y) {
-    constexpr bool hasRealSignal = requires(const X *sample) { *sample + 1.0; };
-    typedef DirectForm<HandleTraits<Coefficients>::code,
-                       hasRealSignal ? ElementType::DBL : ElementType::CDB>
-        Filter;
+// The signal is one of the handle type `Signal`.
+template <class Signal, class Coefficients>
+using Filter = DirectForm<HandleTraits<Coefficients>::code, HandleTraits<Signal>::code>;
+
+template <class Signal, class Coefficients>
+ErrorCode RunDirect(Path path, const In<Coefficients> &a, const In<Coefficients> &b,
+                    typename Filter<Signal, Coefficients>::X *xState,
+                    typename Filter<Signal, Coefficients>::Y *yState,
+                    const typename Filter<Signal, Coefficients>::X *x, int32_t n,
+                    typename Filter<Signal, Coefficients>::Y *y) {
+    typedef Filter<Signal, Coefficients> F;
     if (path == Path::FIR)
-        return Filter::fir(b.data(), b.size(), x, n, xState, y);
-    return Filter::iir(b.data(), b.size(), xState, a.data(), a.size(), yState, x, n, y);
+        return F::fir(b.data(), b.size(), x, n, xState, y);
+    return F::iir(b.data(), b.size(), xState, a.data(), a.size(), yState, x, n, y);
 }
 
 template <class XState, class YState>
@@ -97,8 +101,8 @@ Outcome FilterTwoStates(Kept<Signal> x, In<Coefficients> a, In<Coefficients> b, 
         return EmptiedOnFailure(x, ErrSizesDisagree);
     if (const Outcome bad = FitBoth(xState, b.size(), yState, a.size(), clears))
         return bad;
-    return EmptiedOnFailure(
-        x, RunDirect(path, a, b, xState.data(), yState.data(), x.data(), x.size(), x.data()));
+    return EmptiedOnFailure(x, RunDirect<Signal>(path, a, b, xState.data(), yState.data(), x.data(),
+                                                 x.size(), x.data()));
 }
 
 // A real signal through a complex filter.
@@ -118,11 +122,11 @@ Outcome FilterIntoComplex(In<DBL1D> x, Out<CDB1D> y, In<CDB1D> a, In<CDB1D> b, K
     }
     if (const Outcome bad = FitBoth(xState, b.size(), yState, a.size(), clears))
         return bad;
-    return RunDirect(path, a, b, xState.data(), yState.data(), x.data(), x.size(), y.data());
+    return RunDirect<DBL1D>(path, a, b, xState.data(), yState.data(), x.data(), x.size(), y.data());
 }
 
 // The state of x and that of y in one array.
-template <class State>
+template <class Signal, class State>
 Outcome RunJoined(Path path, const In<DBL1D> &a, const In<DBL1D> &b, State &state, bool clears,
                   typename State::T *x, int32_t n) {
     const int32_t ofX = Memory(b.size());
@@ -133,7 +137,7 @@ Outcome RunJoined(Path path, const In<DBL1D> &a, const In<DBL1D> &b, State &stat
         return bad;
     if (clears)
         Clear(state);
-    return RunDirect(path, a, b, state.data(), state.data() + ofX, x, n, x);
+    return RunDirect<Signal>(path, a, b, state.data(), state.data() + ofX, x, n, x);
 }
 
 template <class Signal>
@@ -146,7 +150,7 @@ Outcome FilterOneState(InOut<Signal> x, In<DBL1D> a, In<DBL1D> b, InOut<Signal> 
         return 0;
     if (path == Path::Missing)
         return ErrSizesDisagree;
-    return RunJoined(path, a, b, state, clears, x.data(), x.size());
+    return RunJoined<Signal>(path, a, b, state, clears, x.data(), x.size());
 }
 
 template <class State>
@@ -180,7 +184,7 @@ Outcome FilterCascade(Kept<Signal> x, int32_t form, In<DBL1D> a, In<DBL1D> b, Ke
 
 enum SampleMode : int32_t { SecondOrderSections = 0, FourthOrderSections, DirectIIR, DirectFIR };
 
-template <class State>
+template <class Signal, class State>
 Outcome RunSample(typename State::T *x, int32_t mode, const In<DBL1D> &a, const In<DBL1D> &b,
                   State &state, bool clears) {
     if (mode < SecondOrderSections || mode > DirectFIR)
@@ -195,14 +199,14 @@ Outcome RunSample(typename State::T *x, int32_t mode, const In<DBL1D> &a, const 
         return ErrSizesDisagree;
     if (isCascade)
         return RunCascade(mode, a, b, state, clears, x, 1);
-    return RunJoined(path, a, b, state, clears, x, 1);
+    return RunJoined<Signal>(path, a, b, state, clears, x, 1);
 }
 
 // kept: a failure leaves 0 in the sample, and not the NaN of other scalars.
 template <class Signal>
 Outcome FilterSample(typename HandleTraits<Signal>::T *x, int32_t mode, In<DBL1D> a, In<DBL1D> b,
                      InOut<Signal> state, bool clears) {
-    const Outcome outcome = RunSample(x, mode, a, b, state, clears);
+    const Outcome outcome = RunSample<Signal>(x, mode, a, b, state, clears);
     if (outcome.failed())
         *x = {};
     return outcome;
