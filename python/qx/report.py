@@ -290,7 +290,10 @@ def power(recording):
                    rows, [_svg(plt, figure)])
 
 
-SECTIONS = [overview, statistics, histogram, amplitudes, power]
+# Families with sections of their own; they take the above from here.
+from .sections_filtering import filtered  # noqa: E402
+
+SECTIONS = [overview, statistics, histogram, amplitudes, power, filtered]
 
 
 # Output

@@ -146,7 +146,7 @@ class Report(InFolder):
         text = page.read_text("utf-8")
         self.assertIn("MIT-BIH", text)
         figures = re.findall(r"<svg.*?</svg>", text, re.DOTALL)
-        self.assertEqual(len(figures), 5)
+        self.assertEqual(len(figures), 6)
         for figure in figures:
             xml.etree.ElementTree.fromstring(figure)
 
