@@ -1,0 +1,210 @@
+#ifndef QX_LINEAR_SYSTEMS_H
+#define QX_LINEAR_SYSTEMS_H
+
+/* Linear systems, least squares and inverses.
+
+   Matrices are blocks of rows and columns, row after row. The exports with *err have the function
+   result 0 and run all their checks, of which the last failed one decides; those without return
+   the code of the first failed check. A failure empties the outputs. */
+
+#include "qx/matrix_factorisations.h"
+
+QX_BEGIN_DECLS
+
+/** Solves a x = b for a square a by LU factorisation with row exchanges. A refused resize gives
+    the host's own status as the function result. Non-finite data are not looked for.
+    Codes: ErrEmptyInput (a or b is empty), ErrNotSquare (a is not square), ErrSizeMismatch (b has
+    not as many elements as a has rows), ErrOutOfMemory (no memory, or the host refused the
+    resize), ErrSingularMatrix (a column has no pivot but 0). */
+QX_API int32_t EqsByLUDri_head(QX_IN DBL2D a, QX_IN DBL1D b, QX_OUT DBL1D x, QX_OUT ErrorCode *err);
+/** As EqsByLUDri_head, for complex data. */
+QX_API int32_t CxEqsByLUDri_head(QX_IN CDB2D a, QX_IN CDB1D b, QX_OUT CDB1D x,
+                                 QX_OUT ErrorCode *err);
+
+/** Not available: it checks its arguments, sizes x, empties it and fails. Several right sides are
+    solved for by EqsSetBySVDDri_head.
+    Codes: ErrEmptyInput (a or b is empty), ErrNotSquare (a is not square), ErrSizeMismatch (b
+    has not as many rows as a), ErrOutOfMemory (the host refused the resize), ErrNotAvailable
+    (always). */
+QX_API ErrorCode EqsSetByLUDri_head(QX_IN DBL2D a, QX_IN DBL2D b, QX_OUT DBL2D x);
+/** As EqsSetByLUDri_head, for complex data. */
+QX_API ErrorCode CxEqsSetByLUDri_head(QX_IN CDB2D a, QX_IN CDB2D b, QX_OUT CDB2D x);
+
+/** Solves in place of b with the factors and pivots of LU_head. A zero on the diagonal gives
+    infinities or NaN.
+    Codes: ErrEmptyInput (lu, pivots or b is empty), ErrNotSquare (lu is not square),
+    ErrSizeMismatch (pivots or b has not as many elements as lu has rows), ErrIndexOutOfRange (a
+    pivot is no row of lu). */
+QX_API int32_t LULinEqs_head(QX_IN DBL2D lu, QX_IN I32_1D pivots, QX_INOUT DBL1D b,
+                             QX_OUT ErrorCode *err);
+/** As LULinEqs_head, for complex data. */
+QX_API int32_t CxLULinEqs_head(QX_IN CDB2D lu, QX_IN I32_1D pivots, QX_INOUT CDB1D b,
+                               QX_OUT ErrorCode *err);
+
+/** Inverse by LU factorisation, in place of a.
+    Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrOutOfMemory (no memory),
+    ErrSingularMatrix (a column has no pivot but 0). */
+QX_API int32_t InvMatrixLUDri_head(QX_INOUT DBL2D a, QX_OUT ErrorCode *err);
+/** As InvMatrixLUDri_head, for complex data. */
+QX_API int32_t CxInvMatrixLUDri_head(QX_INOUT CDB2D a, QX_OUT ErrorCode *err);
+
+/** Inverse from the factors and pivots of LU_head, in place of the factors. A zero on the diagonal
+    gives infinities or NaN.
+    Codes: ErrEmptyInput (lu or pivots is empty), ErrNotSquare (lu is not square), ErrSizeMismatch
+    (pivots has not as many elements as lu has rows), ErrOutOfMemory (no memory),
+    ErrIndexOutOfRange (a pivot is no row of lu). */
+QX_API int32_t LUInvMatrix_head(QX_INOUT DBL2D lu, QX_IN I32_1D pivots, QX_OUT ErrorCode *err);
+/** As LUInvMatrix_head, for complex data. */
+QX_API int32_t CxLUInvMatrix_head(QX_INOUT CDB2D lu, QX_IN I32_1D pivots, QX_OUT ErrorCode *err);
+
+/** Least-squares solution of smallest norm of a x = b for an m by n matrix, by singular values.
+    Values up to max(m, n) times 2.2e-16 times the largest one count as 0; a lack of rank is no
+    failure. A refused resize gives the host's own status as the function result.
+    Codes: ErrEmptyInput (a or b is empty), ErrSizeMismatch (b has not as many elements as a has
+    rows), ErrOutOfMemory (no memory, or the host refused the resize), ErrNonFiniteInput (a or b
+    holds NaN or infinity), ErrIterationLimit (the singular values do not converge). */
+QX_API int32_t GenLinEqs_head(QX_IN DBL2D a, QX_IN DBL1D b, QX_OUT DBL1D x, QX_OUT ErrorCode *err);
+/** As GenLinEqs_head, for complex data. */
+QX_API int32_t CxGenLinEqs_head(QX_IN CDB2D a, QX_IN CDB1D b, QX_OUT CDB1D x,
+                                QX_OUT ErrorCode *err);
+
+/** As GenLinEqs_head, with the tolerance in place of 2.2e-16, which one of 0 or below still
+    selects, and 0 as the function result even where the host refuses a resize. */
+QX_API int32_t GenLinEqs82_head(QX_IN DBL2D a, QX_IN DBL1D b, QX_OUT DBL1D x, double tolerance,
+                                QX_OUT ErrorCode *err);
+/** As GenLinEqs82_head, for complex data. */
+QX_API int32_t CxGenLinEqs82_head(QX_IN CDB2D a, QX_IN CDB1D b, QX_OUT CDB1D x, double tolerance,
+                                  QX_OUT ErrorCode *err);
+
+/** Least-squares solution as GenLinEqs82_head gives it. `work` shows the memory of the method:
+    with k = min(m, n) it gets k (m + n + 1) + m n + k elements, and k m more where m is above 1.
+    It starts with U (m by k), the singular values and V (n by k) of a, scaled by the inverse
+    singular values.
+    Codes: ErrEmptyInput (a or b is empty), ErrSizeMismatch (b has not as many elements as a has
+    rows), ErrOutOfMemory (no memory, or the host refused a resize), ErrNonFiniteInput (a or b
+    holds NaN or infinity), ErrIterationLimit (the singular values do not converge). */
+QX_API ErrorCode GenLinEqs2010_head(QX_IN DBL2D a, QX_IN DBL1D b, QX_OUT DBL1D x, double tolerance,
+                                    QX_OUT DBL1D work);
+
+/** As GenLinEqs2010_head, with iterative refinement and m + n more elements of `work`: starting
+    from 0, x is improved `refinements` times by the least-squares solution for what is left of b.
+    Singular values up to the tolerance times the largest one count as 0, without the factor max(m,
+    n); only a tolerance below 0 selects 2.2e-16. 0 refinements take the plain method, and a
+    negative count leaves x at 0. */
+QX_API ErrorCode GenLinEqsbySVD2011_head(QX_IN DBL2D a, QX_IN DBL1D b, QX_OUT DBL1D x,
+                                         double tolerance, int32_t refinements, QX_OUT DBL1D work);
+
+/** Least-squares solutions of smallest norm of a x = b for all columns of b, as GenLinEqs_head.
+    Here a lack of rank shows in the code.
+    Codes: ErrEmptyInput (a or b is empty), ErrSizeMismatch (b has not as many rows as a),
+    ErrOutOfMemory (no memory, or the host refused the resize), ErrNonFiniteInput (a or b holds NaN
+    or infinity), ErrIterationLimit (the singular values do not converge), WarnRankDeficient
+    (singular values count as 0; x is valid). */
+QX_API ErrorCode EqsSetBySVDDri_head(QX_IN DBL2D a, QX_IN DBL2D b, QX_OUT DBL2D x);
+/** As EqsSetBySVDDri_head, for complex data. */
+QX_API ErrorCode CxEqsSetBySVDDri_head(QX_IN CDB2D a, QX_IN CDB2D b, QX_OUT CDB2D x);
+
+/** As EqsSetBySVDDri_head, with the tolerance in place of 2.2e-16, which one of 0 or below still
+    selects. */
+QX_API ErrorCode EqsSetBySVDDri82_head(QX_IN DBL2D a, QX_IN DBL2D b, QX_OUT DBL2D x,
+                                       double tolerance);
+/** As EqsSetBySVDDri82_head, for complex data. */
+QX_API ErrorCode CxEqsSetBySVDDri82_head(QX_IN CDB2D a, QX_IN CDB2D b, QX_OUT CDB2D x,
+                                         double tolerance);
+
+/** Solves a x = b for a positive definite a by Cholesky factorisation, of which the upper triangle
+    is read.
+    Codes: ErrEmptyInput (a or b is empty), ErrNotSquare (a is not square), ErrSizeMismatch (b has
+    not as many elements as a has rows), ErrOutOfMemory (no memory, or the host refused the
+    resize), ErrNonFiniteInput (a or b holds NaN or infinity), ErrNotPositiveDefinite (a is not
+    positive definite, or nearly not). */
+QX_API int32_t EqsByCholeskyDri_head(QX_IN DBL2D a, QX_IN DBL1D b, QX_OUT DBL1D x,
+                                     QX_OUT ErrorCode *err);
+/** As EqsByCholeskyDri_head, for a Hermitian matrix. */
+QX_API int32_t CxEqsByCholeskyDri_head(QX_IN CDB2D a, QX_IN CDB1D b, QX_OUT CDB1D x,
+                                       QX_OUT ErrorCode *err);
+
+/** As EqsByCholeskyDri_head, for all columns of b, with the upper triangle of a if useUpper is not
+    0, else the lower one. The code is the function result. */
+QX_API ErrorCode EqsSetByCholeskyDri_head(QX_IN DBL2D a, int32_t useUpper, QX_IN DBL2D b,
+                                          QX_OUT DBL2D x);
+/** As EqsSetByCholeskyDri_head, for a Hermitian matrix. */
+QX_API ErrorCode CxEqsSetByCholeskyDri_head(QX_IN CDB2D a, int32_t useUpper, QX_IN CDB2D b,
+                                            QX_OUT CDB2D x);
+
+/** Solves L L^T x = b in place of b with a packed lower factor of Cholesky_head.
+    Codes: ErrEmptyInput (packedFactor or b is empty), ErrNotSquare (the length of packedFactor is
+    no n (n+1) / 2), ErrSizeMismatch (b has not n elements). */
+QX_API int32_t CholeskyLinEqs_head(QX_IN DBL1D packedFactor, QX_INOUT DBL1D b,
+                                   QX_OUT ErrorCode *err);
+/** As CholeskyLinEqs_head, for complex data: L L^H x = b. */
+QX_API int32_t CxCholeskyLinEqs_head(QX_IN CDB1D packedFactor, QX_INOUT CDB1D b,
+                                     QX_OUT ErrorCode *err);
+
+/** Solves a x = b for all columns of b with the lower (`triangle` 0) or upper (1) triangle of a;
+    the other one is not read.
+    Codes: ErrEmptyInput (a or b is empty), ErrNotSquare (a is not square), ErrSizeMismatch (b has
+    not as many rows as a), ErrInvalidSelector (triangle is neither 0 nor 1), ErrOutOfMemory (no
+    memory, or the host refused the resize), ErrNonFiniteInput (the triangle or b holds NaN or
+    infinity), ErrSingularMatrix (the modulus of a diagonal element is not above 2.2e-16 times the
+    largest modulus of the triangle). */
+QX_API ErrorCode TriEqsSetDri_head(QX_IN DBL2D a, int32_t triangle, QX_IN DBL2D b, QX_OUT DBL2D x);
+/** As TriEqsSetDri_head, for complex data. */
+QX_API ErrorCode CxTriEqsSetDri_head(QX_IN CDB2D a, int32_t triangle, QX_IN CDB2D b,
+                                     QX_OUT CDB2D x);
+
+/** As TriEqsSetDri_head, for a packed triangle and in place of b, with the code in *err.
+    Codes: ErrEmptyInput (a or b is empty), ErrNotSquare (the packed length is no n (n+1) / 2),
+    ErrSizeMismatch (b has not n elements), ErrInvalidSelector (triangle is neither 0 nor 1),
+    ErrNonFiniteInput (a or b holds NaN or infinity), ErrSingularMatrix (as there). */
+QX_API int32_t TriLinEqs_head(QX_IN const PackedTriangle *a, QX_INOUT DBL1D b,
+                              QX_OUT ErrorCode *err);
+/** As TriLinEqs_head, for complex data. */
+QX_API int32_t CxTriLinEqs_head(QX_IN const CxPackedTriangle *a, QX_INOUT CDB1D b,
+                                QX_OUT ErrorCode *err);
+
+/** Solves a band system in place of b. Row upperBands + i - j, column j of `band` holds a(i, j),
+    so row 0 is the topmost diagonal. Through LAPACK; the last bits depend on the processor.
+    Codes: ErrSizesDisagree (band has not lowerBands + upperBands + 1 rows), ErrBandVectorSize (b
+    has not as many elements as band has columns), ErrEmptyInput (band has no column),
+    ErrSizesDisagree (a count of bands is below 0, or both together are above the order),
+    ErrOutOfMemory (no memory), ErrSingularMatrix (a pivot is 0). */
+QX_API ErrorCode BandEqsDriH(QX_IN DBL2D band, QX_INOUT DBL1D b, int32_t lowerBands,
+                             int32_t upperBands);
+/** As BandEqsDriH, for complex data. */
+QX_API ErrorCode CxBandEqsDriH(QX_IN CDB2D band, QX_INOUT CDB1D b, int32_t lowerBands,
+                               int32_t upperBands);
+
+/** As BandEqsDriH, for all columns of b. */
+QX_API ErrorCode BandEqsSetDriH(QX_IN DBL2D band, QX_INOUT DBL2D b, int32_t lowerBands,
+                                int32_t upperBands);
+/** As BandEqsSetDriH, for complex data. */
+QX_API ErrorCode CxBandEqsSetDriH(QX_IN CDB2D band, QX_INOUT CDB2D b, int32_t lowerBands,
+                                  int32_t upperBands);
+
+/** LU factorisation with row exchanges of a tridiagonal matrix of order n, in place: the
+    multipliers, the diagonal and the first superdiagonal of U; upper2 gets the second one, pivots
+    the row (counted from 1) that step i was exchanged with.
+    Codes: ErrFewerThanThree (diag has fewer than 3 elements), ErrSizesDisagree (lower or upper has
+    not n - 1 elements), ErrOutOfMemory (no memory, or the host refused a resize), WarnSingular (a
+    pivot is 0; the factors are complete but solve nothing). */
+QX_API ErrorCode TriDiagLU_head(QX_INOUT DBL1D lower, QX_INOUT DBL1D diag, QX_INOUT DBL1D upper,
+                                QX_OUT DBL1D upper2, QX_OUT I32_1D pivots);
+
+/** Solves with the factors of TriDiagLU_head in place of b, or with their transpose if
+    `transposed` is not 0. A pivot of 0 gives infinities or NaN.
+    Codes: ErrFewerThanThree (diag has fewer than 3 elements), ErrSizesDisagree (a factor or b has
+    not the size that belongs to diag), ErrOutOfMemory (no memory), ErrIndexOutOfRange (pivots
+    holds another row than i or i + 1 at step i). */
+QX_API ErrorCode TriDiagEqsByLU_head(int32_t transposed, QX_IN DBL1D lower, QX_IN DBL1D diag,
+                                     QX_IN DBL1D upper, QX_IN DBL1D upper2, QX_IN I32_1D pivots,
+                                     QX_INOUT DBL1D b);
+
+/** As TriDiagEqsByLU_head, for all columns of b. */
+QX_API ErrorCode TriDiagEqsSetByLU_head(int32_t transposed, QX_IN DBL1D lower, QX_IN DBL1D diag,
+                                        QX_IN DBL1D upper, QX_IN DBL1D upper2, QX_IN I32_1D pivots,
+                                        QX_INOUT DBL2D b);
+
+QX_END_DECLS
+
+#endif

@@ -1,0 +1,369 @@
+#include "qx/linear_systems.h"
+
+#include "frame/export.h"
+#include "linalg/matrix.h"
+#include "linalg/systems/banded.h"
+#include "linalg/systems/least_squares.h"
+#include "linalg/systems/lu.h"
+#include "linalg/systems/substitution.h"
+#include "linalg/systems/triangular.h"
+
+namespace qx {
+namespace {
+
+// A lack of rank as the older exports tell it: not at all.
+ErrorCode WithoutRankWarning(ErrorCode status) { return status == WarnRankDeficient ? 0 : status; }
+
+// LU.
+
+template <class Matrix, class Vector>
+Outcome SolveLU(In<Matrix> a, In<Vector> b, Out<Vector> x) {
+    if (const Outcome bad = LastFailed({{a.isEmpty() || b.isEmpty(), ErrEmptyInput},
+                                        {!a.isSquare(), ErrNotSquare},
+                                        {b.size() != a.rows(), ErrSizeMismatch}}))
+        return bad;
+    if (const Outcome bad = x.resize(a.rows()))
+        return bad;
+    return SolveByLU(a.data(), a.rows(), b.data(), x.data());
+}
+
+// kept: nothing is solved; the export always fails once its arguments are good.
+template <class Matrix>
+Outcome SolveSetLU(In<Matrix> a, In<Matrix> b, Out<Matrix> x) {
+    if (const Outcome bad = FirstFailed({{a.isEmpty() || b.isEmpty(), ErrEmptyInput},
+                                         {!a.isSquare(), ErrNotSquare},
+                                         {b.rows() != a.rows(), ErrSizeMismatch}}))
+        return bad;
+    if (const Outcome bad = x.resize(a.rows(), b.cols()))
+        return bad;
+    return ErrNotAvailable;
+}
+
+template <class Matrix, class Vector>
+Outcome SolveWithFactors(In<Matrix> lu, In<I32_1D> pivots, InOut<Vector> b) {
+    if (const Outcome bad =
+            LastFailed({{lu.isEmpty() || pivots.isEmpty() || b.isEmpty(), ErrEmptyInput},
+                        {!lu.isSquare(), ErrNotSquare},
+                        {pivots.size() != lu.rows(), ErrSizeMismatch},
+                        {b.size() != lu.rows(), ErrSizeMismatch}}))
+        return bad;
+    return LUSolve(lu.data(), pivots.data(), b.data(), lu.rows(), 1, b.data());
+}
+
+template <class Matrix>
+Outcome Invert(InOut<Matrix> a) {
+    if (const Outcome bad =
+            LastFailed({{a.isEmpty(), ErrEmptyInput}, {!a.isSquare(), ErrNotSquare}}))
+        return bad;
+    return InvertByLU(a.data(), a.rows(), a.data());
+}
+
+template <class Matrix>
+Outcome InvertFromFactors(InOut<Matrix> lu, In<I32_1D> pivots) {
+    if (const Outcome bad = LastFailed({{lu.isEmpty() || pivots.isEmpty(), ErrEmptyInput},
+                                        {!lu.isSquare(), ErrNotSquare},
+                                        {pivots.size() != lu.rows(), ErrSizeMismatch}}))
+        return bad;
+    return InvertFactors(lu.data(), pivots.data(), lu.rows());
+}
+
+// Least squares.
+
+template <class Matrix, class Vector>
+Outcome SolveLeastSquares(In<Matrix> a, In<Vector> b, Out<Vector> x, double tolerance) {
+    if (const Outcome bad = LastFailed(
+            {{a.isEmpty() || b.isEmpty(), ErrEmptyInput}, {b.size() != a.rows(), ErrSizeMismatch}}))
+        return bad;
+    if (const Outcome bad = x.resize(a.cols()))
+        return bad;
+    return WithoutRankWarning(
+        SolveBySVD(a.data(), a.rows(), a.cols(), b.data(), 1, x.data(), tolerance));
+}
+
+template <class Matrix>
+Outcome SolveLeastSquaresSet(In<Matrix> a, In<Matrix> b, Out<Matrix> x, double tolerance) {
+    if (const Outcome bad = FirstFailed(
+            {{a.isEmpty() || b.isEmpty(), ErrEmptyInput}, {b.rows() != a.rows(), ErrSizeMismatch}}))
+        return bad;
+    if (const Outcome bad = x.resize(a.cols(), b.cols()))
+        return bad;
+    return SolveBySVD(a.data(), a.rows(), a.cols(), b.data(), b.cols(), x.data(), tolerance);
+}
+
+// The memory that is shown, with `more` elements than the plain method needs.
+Outcome ResizeWork(In<DBL2D> a, Out<DBL1D> &work, int64_t more) {
+    const int64_t count = LeastSquaresWork(a.rows(), a.cols()) + more;
+    if (count > std::numeric_limits<int32_t>::max())
+        return ErrOutOfMemory;
+    return work.resize(static_cast<int32_t>(count));
+}
+
+Outcome SolveShowingWork(In<DBL2D> a, In<DBL1D> b, Out<DBL1D> x, double tolerance,
+                         Out<DBL1D> work) {
+    if (const Outcome bad = FirstFailed(
+            {{a.isEmpty() || b.isEmpty(), ErrEmptyInput}, {b.size() != a.rows(), ErrSizeMismatch}}))
+        return bad;
+    if (const Outcome bad = x.resize(a.cols()))
+        return bad;
+    if (const Outcome bad = ResizeWork(a, work, 0))
+        return bad;
+    return WithoutRankWarning(
+        SolveBySVDIn(work.data(), a.data(), a.rows(), a.cols(), b.data(), x.data(), tolerance));
+}
+
+Outcome SolveRefined(In<DBL2D> a, In<DBL1D> b, Out<DBL1D> x, double tolerance, int32_t refinements,
+                     Out<DBL1D> work) {
+    if (refinements == 0)
+        return SolveShowingWork(a, b, x, tolerance, work);
+    if (const Outcome bad = FirstFailed(
+            {{a.isEmpty() || b.isEmpty(), ErrEmptyInput}, {b.size() != a.rows(), ErrSizeMismatch}}))
+        return bad;
+    if (const Outcome bad = x.resize(a.cols()))
+        return bad;
+    if (const Outcome bad = ResizeWork(a, work, int64_t{a.rows()} + a.cols()))
+        return bad;
+    return WithoutRankWarning(SolveBySVDRefined(work.data(), a.data(), a.rows(), a.cols(), b.data(),
+                                                x.data(), tolerance, refinements));
+}
+
+// Positive definite matrices.
+
+template <class Matrix, class Vector>
+Outcome SolveDefinite(In<Matrix> a, In<Vector> b, Out<Vector> x) {
+    if (const Outcome bad = LastFailed({{a.isEmpty() || b.isEmpty(), ErrEmptyInput},
+                                        {!a.isSquare(), ErrNotSquare},
+                                        {b.size() != a.rows(), ErrSizeMismatch}}))
+        return bad;
+    if (const Outcome bad = x.resize(a.rows()))
+        return bad;
+    return CholeskySolve(a.data(), a.rows(), 1, b.data(), 1, x.data());
+}
+
+template <class Matrix>
+Outcome SolveDefiniteSet(In<Matrix> a, int32_t useUpper, In<Matrix> b, Out<Matrix> x) {
+    if (const Outcome bad = FirstFailed({{a.isEmpty() || b.isEmpty(), ErrEmptyInput},
+                                         {!a.isSquare(), ErrNotSquare},
+                                         {b.rows() != a.rows(), ErrSizeMismatch}}))
+        return bad;
+    if (const Outcome bad = x.resize(a.rows(), b.cols()))
+        return bad;
+    return CholeskySolve(a.data(), a.rows(), useUpper, b.data(), b.cols(), x.data());
+}
+
+template <class Vector>
+Outcome SolveWithCholesky(In<Vector> packedFactor, InOut<Vector> b) {
+    const int32_t n = OrderOfPacked(packedFactor.size());
+    if (const Outcome bad = LastFailed({{packedFactor.isEmpty() || b.isEmpty(), ErrEmptyInput},
+                                        {n < 1, ErrNotSquare},
+                                        {n >= 1 && b.size() != n, ErrSizeMismatch}}))
+        return bad;
+    return Substitute(Factors::cholesky, packedFactor.data(), n, 1, b.data());
+}
+
+// Triangles.
+
+template <class Matrix>
+Outcome SolveTriangleSet(In<Matrix> a, int32_t triangle, In<Matrix> b, Out<Matrix> x) {
+    if (const Outcome bad = FirstFailed(
+            {{a.isEmpty() || b.isEmpty(), ErrEmptyInput},
+             {!a.isSquare(), ErrNotSquare},
+             {b.rows() != a.rows(), ErrSizeMismatch},
+             {triangle != lowerTriangle && triangle != upperTriangle, ErrInvalidSelector}}))
+        return bad;
+    if (const Outcome bad = x.resize(a.rows(), b.cols()))
+        return bad;
+    Scratch<HandleTraits<Matrix>::code> packed;
+    if (const ErrorCode failed = packed.allocate(PackedLength(a.rows())))
+        return failed;
+    PackMatrix(a.data(), a.rows(), triangle, packed.data());
+    std::memcpy(x.data(), b.data(),
+                sizeof *b.data() * static_cast<std::size_t>(b.rows()) * b.cols());
+    return SolveTriangular(packed.data(), a.rows(), triangle, b.cols(), x.data());
+}
+
+template <class Vector>
+Outcome SolveTriangle(In<Vector> packed, int32_t triangle, InOut<Vector> b) {
+    const int32_t n = OrderOfPacked(packed.size());
+    if (const Outcome bad = LastFailed(
+            {{packed.isEmpty() || b.isEmpty(), ErrEmptyInput},
+             {n < 1, ErrNotSquare},
+             {n >= 1 && b.size() != n, ErrSizeMismatch},
+             {triangle != lowerTriangle && triangle != upperTriangle, ErrInvalidSelector}}))
+        return bad;
+    return SolveTriangular(packed.data(), n, triangle, 1, b.data());
+}
+
+// Bands.
+
+// Sizes of one vector or of several right sides, as rows and columns.
+int32_t Rows(const InOut<DBL1D> &b) { return b.size(); }
+int32_t Rows(const InOut<CDB1D> &b) { return b.size(); }
+int32_t Rows(const InOut<DBL2D> &b) { return b.rows(); }
+int32_t Rows(const InOut<CDB2D> &b) { return b.rows(); }
+int32_t Cols(const InOut<DBL1D> &) { return 1; }
+int32_t Cols(const InOut<CDB1D> &) { return 1; }
+int32_t Cols(const InOut<DBL2D> &b) { return b.cols(); }
+int32_t Cols(const InOut<CDB2D> &b) { return b.cols(); }
+
+template <class Matrix, class RightSide>
+Outcome SolveBands(In<Matrix> band, InOut<RightSide> b, int32_t lowerBands, int32_t upperBands) {
+    if (const Outcome bad =
+            FirstFailed({{band.rows() != int64_t{lowerBands} + upperBands + 1, ErrSizesDisagree},
+                         {Rows(b) != band.cols(), ErrBandVectorSize}}))
+        return bad;
+    return SolveBand(band.data(), band.cols(), lowerBands, upperBands, Cols(b), b.data());
+}
+
+Outcome FactorTridiagonals(InOut<DBL1D> lower, InOut<DBL1D> diag, InOut<DBL1D> upper,
+                           Out<DBL1D> upper2, Out<I32_1D> pivots) {
+    const int32_t n = diag.size();
+    if (const Outcome bad =
+            FirstFailed({{n < 3, ErrFewerThanThree},
+                         {lower.size() != n - 1 || upper.size() != n - 1, ErrSizesDisagree}}))
+        return bad;
+    if (const Outcome bad = upper2.resize(n - 2))
+        return bad;
+    if (const Outcome bad = pivots.resize(n))
+        return bad;
+    return FactorTridiagonal(n, lower.data(), diag.data(), upper.data(), upper2.data(),
+                             pivots.data());
+}
+
+template <class RightSide>
+Outcome SolveTridiagonals(int32_t transposed, In<DBL1D> lower, In<DBL1D> diag, In<DBL1D> upper,
+                          In<DBL1D> upper2, In<I32_1D> pivots, InOut<RightSide> b) {
+    const int32_t n = diag.size();
+    if (const Outcome bad =
+            FirstFailed({{n < 3, ErrFewerThanThree},
+                         {lower.size() != n - 1 || upper.size() != n - 1, ErrSizesDisagree},
+                         {upper2.size() != n - 2 || pivots.size() != n, ErrSizesDisagree},
+                         {Rows(b) != n || Cols(b) < 1, ErrSizesDisagree}}))
+        return bad;
+    return SolveTridiagonal(transposed != 0, n, lower.data(), diag.data(), upper.data(),
+                            upper2.data(), pivots.data(), Cols(b), b.data());
+}
+
+} // namespace
+} // namespace qx
+
+using qx::InErr;
+using qx::InErrWithHost;
+using qx::Returned;
+
+int32_t EqsByLUDri_head(DBL2D a, DBL1D b, DBL1D x, ErrorCode *err) {
+    return InErrWithHost(err, qx::SolveLU<DBL2D, DBL1D>, a, b, x);
+}
+int32_t CxEqsByLUDri_head(CDB2D a, CDB1D b, CDB1D x, ErrorCode *err) {
+    return InErrWithHost(err, qx::SolveLU<CDB2D, CDB1D>, a, b, x);
+}
+ErrorCode EqsSetByLUDri_head(DBL2D a, DBL2D b, DBL2D x) {
+    return Returned(qx::SolveSetLU<DBL2D>, a, b, x);
+}
+ErrorCode CxEqsSetByLUDri_head(CDB2D a, CDB2D b, CDB2D x) {
+    return Returned(qx::SolveSetLU<CDB2D>, a, b, x);
+}
+int32_t LULinEqs_head(DBL2D lu, I32_1D pivots, DBL1D b, ErrorCode *err) {
+    return InErr(err, qx::SolveWithFactors<DBL2D, DBL1D>, lu, pivots, b);
+}
+int32_t CxLULinEqs_head(CDB2D lu, I32_1D pivots, CDB1D b, ErrorCode *err) {
+    return InErr(err, qx::SolveWithFactors<CDB2D, CDB1D>, lu, pivots, b);
+}
+int32_t InvMatrixLUDri_head(DBL2D a, ErrorCode *err) { return InErr(err, qx::Invert<DBL2D>, a); }
+int32_t CxInvMatrixLUDri_head(CDB2D a, ErrorCode *err) { return InErr(err, qx::Invert<CDB2D>, a); }
+int32_t LUInvMatrix_head(DBL2D lu, I32_1D pivots, ErrorCode *err) {
+    return InErr(err, qx::InvertFromFactors<DBL2D>, lu, pivots);
+}
+int32_t CxLUInvMatrix_head(CDB2D lu, I32_1D pivots, ErrorCode *err) {
+    return InErr(err, qx::InvertFromFactors<CDB2D>, lu, pivots);
+}
+
+int32_t GenLinEqs_head(DBL2D a, DBL1D b, DBL1D x, ErrorCode *err) {
+    return InErrWithHost(err, qx::SolveLeastSquares<DBL2D, DBL1D>, a, b, x, -1.0);
+}
+int32_t CxGenLinEqs_head(CDB2D a, CDB1D b, CDB1D x, ErrorCode *err) {
+    return InErrWithHost(err, qx::SolveLeastSquares<CDB2D, CDB1D>, a, b, x, -1.0);
+}
+int32_t GenLinEqs82_head(DBL2D a, DBL1D b, DBL1D x, double tolerance, ErrorCode *err) {
+    return InErr(err, qx::SolveLeastSquares<DBL2D, DBL1D>, a, b, x, tolerance);
+}
+int32_t CxGenLinEqs82_head(CDB2D a, CDB1D b, CDB1D x, double tolerance, ErrorCode *err) {
+    return InErr(err, qx::SolveLeastSquares<CDB2D, CDB1D>, a, b, x, tolerance);
+}
+ErrorCode GenLinEqs2010_head(DBL2D a, DBL1D b, DBL1D x, double tolerance, DBL1D work) {
+    return Returned(qx::SolveShowingWork, a, b, x, tolerance, work);
+}
+ErrorCode GenLinEqsbySVD2011_head(DBL2D a, DBL1D b, DBL1D x, double tolerance, int32_t refinements,
+                                  DBL1D work) {
+    return Returned(qx::SolveRefined, a, b, x, tolerance, refinements, work);
+}
+ErrorCode EqsSetBySVDDri_head(DBL2D a, DBL2D b, DBL2D x) {
+    return EqsSetBySVDDri82_head(a, b, x, -1.0);
+}
+ErrorCode CxEqsSetBySVDDri_head(CDB2D a, CDB2D b, CDB2D x) {
+    return CxEqsSetBySVDDri82_head(a, b, x, -1.0);
+}
+ErrorCode EqsSetBySVDDri82_head(DBL2D a, DBL2D b, DBL2D x, double tolerance) {
+    return Returned(qx::SolveLeastSquaresSet<DBL2D>, a, b, x, tolerance);
+}
+ErrorCode CxEqsSetBySVDDri82_head(CDB2D a, CDB2D b, CDB2D x, double tolerance) {
+    return Returned(qx::SolveLeastSquaresSet<CDB2D>, a, b, x, tolerance);
+}
+
+int32_t EqsByCholeskyDri_head(DBL2D a, DBL1D b, DBL1D x, ErrorCode *err) {
+    return InErr(err, qx::SolveDefinite<DBL2D, DBL1D>, a, b, x);
+}
+int32_t CxEqsByCholeskyDri_head(CDB2D a, CDB1D b, CDB1D x, ErrorCode *err) {
+    return InErr(err, qx::SolveDefinite<CDB2D, CDB1D>, a, b, x);
+}
+ErrorCode EqsSetByCholeskyDri_head(DBL2D a, int32_t useUpper, DBL2D b, DBL2D x) {
+    return Returned(qx::SolveDefiniteSet<DBL2D>, a, useUpper, b, x);
+}
+ErrorCode CxEqsSetByCholeskyDri_head(CDB2D a, int32_t useUpper, CDB2D b, CDB2D x) {
+    return Returned(qx::SolveDefiniteSet<CDB2D>, a, useUpper, b, x);
+}
+int32_t CholeskyLinEqs_head(DBL1D packedFactor, DBL1D b, ErrorCode *err) {
+    return InErr(err, qx::SolveWithCholesky<DBL1D>, packedFactor, b);
+}
+int32_t CxCholeskyLinEqs_head(CDB1D packedFactor, CDB1D b, ErrorCode *err) {
+    return InErr(err, qx::SolveWithCholesky<CDB1D>, packedFactor, b);
+}
+
+ErrorCode TriEqsSetDri_head(DBL2D a, int32_t triangle, DBL2D b, DBL2D x) {
+    return Returned(qx::SolveTriangleSet<DBL2D>, a, triangle, b, x);
+}
+ErrorCode CxTriEqsSetDri_head(CDB2D a, int32_t triangle, CDB2D b, CDB2D x) {
+    return Returned(qx::SolveTriangleSet<CDB2D>, a, triangle, b, x);
+}
+int32_t TriLinEqs_head(const PackedTriangle *a, DBL1D b, ErrorCode *err) {
+    return InErr(err, qx::SolveTriangle<DBL1D>, a->packed, a->triangle, b);
+}
+int32_t CxTriLinEqs_head(const CxPackedTriangle *a, CDB1D b, ErrorCode *err) {
+    return InErr(err, qx::SolveTriangle<CDB1D>, a->packed, a->triangle, b);
+}
+
+ErrorCode BandEqsDriH(DBL2D band, DBL1D b, int32_t lowerBands, int32_t upperBands) {
+    return Returned(qx::SolveBands<DBL2D, DBL1D>, band, b, lowerBands, upperBands);
+}
+ErrorCode CxBandEqsDriH(CDB2D band, CDB1D b, int32_t lowerBands, int32_t upperBands) {
+    return Returned(qx::SolveBands<CDB2D, CDB1D>, band, b, lowerBands, upperBands);
+}
+ErrorCode BandEqsSetDriH(DBL2D band, DBL2D b, int32_t lowerBands, int32_t upperBands) {
+    return Returned(qx::SolveBands<DBL2D, DBL2D>, band, b, lowerBands, upperBands);
+}
+ErrorCode CxBandEqsSetDriH(CDB2D band, CDB2D b, int32_t lowerBands, int32_t upperBands) {
+    return Returned(qx::SolveBands<CDB2D, CDB2D>, band, b, lowerBands, upperBands);
+}
+
+ErrorCode TriDiagLU_head(DBL1D lower, DBL1D diag, DBL1D upper, DBL1D upper2, I32_1D pivots) {
+    return Returned(qx::FactorTridiagonals, lower, diag, upper, upper2, pivots);
+}
+ErrorCode TriDiagEqsByLU_head(int32_t transposed, DBL1D lower, DBL1D diag, DBL1D upper,
+                              DBL1D upper2, I32_1D pivots, DBL1D b) {
+    return Returned(qx::SolveTridiagonals<DBL1D>, transposed, lower, diag, upper, upper2, pivots,
+                    b);
+}
+ErrorCode TriDiagEqsSetByLU_head(int32_t transposed, DBL1D lower, DBL1D diag, DBL1D upper,
+                                 DBL1D upper2, I32_1D pivots, DBL2D b) {
+    return Returned(qx::SolveTridiagonals<DBL2D>, transposed, lower, diag, upper, upper2, pivots,
+                    b);
+}

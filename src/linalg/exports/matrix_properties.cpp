@@ -1,0 +1,219 @@
+#include "qx/matrix_properties.h"
+
+#include "frame/export.h"
+#include "linalg/properties/definiteness.h"
+#include "linalg/properties/scalars.h"
+#include "linalg/properties/special.h"
+#include "linalg/properties/vectors.h"
+#include "linalg/scalar.h"
+
+namespace qx {
+namespace {
+
+// The element of a handle type as an output: DBL or CDB.
+template <class Handle>
+using OutElement = OutValue<typename ScalarOf<HandleTraits<Handle>::code>::type>;
+
+template <class Matrix>
+ErrorCode SquareFirst(In<Matrix> a) {
+    return FirstFailed({{a.isEmpty(), ErrEmptyInput}, {!a.isSquare(), ErrNotSquare}});
+}
+// kept: the older exports let the last failed check decide.
+template <class Matrix>
+ErrorCode SquareLast(In<Matrix> a) {
+    return LastFailed({{a.isEmpty(), ErrEmptyInput}, {!a.isSquare(), ErrNotSquare}});
+}
+
+template <class Matrix>
+Outcome Determinant(In<Matrix> a, int32_t matrixType, OutElement<Matrix> det) {
+    if (const Outcome bad = SquareLast(a))
+        return bad;
+    return MatrixDeterminant(a.data(), a.rows(), matrixType, det.address());
+}
+
+// kept: the rank is -1 after a failure.
+template <class Matrix>
+Outcome Rank(In<Matrix> a, double tolerance, int32_t *rank) {
+    *rank = -1;
+    if (a.isEmpty())
+        return ErrEmptyInput;
+    return MatrixRank(a.data(), a.rows(), a.cols(), tolerance, rank);
+}
+
+template <class Matrix>
+Outcome Condition(In<Matrix> a, int32_t normType, OutDBL cond) {
+    if (a.isEmpty())
+        return ErrEmptyInput;
+    return ConditionNumber(a.data(), a.rows(), a.cols(), normType, cond.address());
+}
+
+template <class Matrix>
+Outcome Norm(In<Matrix> a, int32_t normType, OutDBL norm) {
+    if (a.isEmpty())
+        return ErrEmptyInput;
+    return MatrixNorm(a.data(), a.rows(), a.cols(), normType, norm.address());
+}
+
+template <class Matrix>
+Outcome Trace(In<Matrix> a, OutElement<Matrix> trace) {
+    if (const Outcome bad = SquareLast(a))
+        return bad;
+    auto sum = ScalarOf<HandleTraits<Matrix>::code>::Of(0.0);
+    for (std::ptrdiff_t i = 0; i < a.rows(); ++i)
+        sum = sum + a.data()[i * a.rows() + i];
+    trace = sum;
+    return 0;
+}
+
+template <class Vector>
+Outcome DotProduct(In<Vector> x, In<Vector> y, OutElement<Vector> dot) {
+    if (const Outcome bad = LastFailed(
+            {{x.isEmpty() || y.isEmpty(), ErrEmptyInput}, {x.size() != y.size(), ErrSizeMismatch}}))
+        return bad;
+    auto sum = ScalarOf<HandleTraits<Vector>::code>::Of(0.0);
+    for (int32_t i = 0; i < x.size(); ++i)
+        sum = sum + x.data()[i] * y.data()[i];
+    dot = sum;
+    return 0;
+}
+
+// The norm alone never writes into the vector.
+template <class Vector>
+Outcome NormOfVector(In<Vector> x, double p, OutDBL norm) {
+    typedef typename HandleTraits<Vector>::T T;
+    return VectorNorm(const_cast<T *>(x.data()), x.size(), p, norm.address(), 0);
+}
+template <class Vector>
+Outcome UnitVector(InOut<Vector> x, double p, OutDBL norm) {
+    return VectorNorm(x.data(), x.size(), p, norm.address(), 1);
+}
+
+Outcome TestSymmetry(In<DBL2D> a, double tolerance, int32_t relative, OutI32 isSymmetric) {
+    if (const Outcome bad = SquareFirst(a))
+        return bad;
+    return CheckSymmetric(a.data(), a.rows(), tolerance, relative, isSymmetric.address());
+}
+Outcome CxTestSymmetry(In<CDB2D> a, double tolerance, int32_t relative, int32_t hermitian,
+                       OutI32 isSymmetric) {
+    if (const Outcome bad = SquareFirst(a))
+        return bad;
+    return CheckSymmetric(a.data(), a.rows(), tolerance, relative, hermitian,
+                          isSymmetric.address());
+}
+
+template <class Matrix>
+Outcome TestDefiniteness(In<Matrix> a, OutI32 isDefinite) {
+    if (const Outcome bad = SquareLast(a))
+        return bad;
+    return CheckPositiveDefinite(a.data(), a.rows(), isDefinite.address());
+}
+
+// kept: the rank is -1 after a failure.
+template <class Matrix>
+Outcome TestSemiDefiniteness(In<Matrix> a, double tolerance, OutI32 isSemiDefinite, int32_t *rank) {
+    *rank = -1;
+    if (const Outcome bad = SquareFirst(a))
+        return bad;
+    return CheckPositiveSemiDefinite(a.data(), a.rows(), tolerance, isSemiDefinite.address(), rank);
+}
+
+template <class Matrix, class Vector>
+Outcome Polynomial(In<Matrix> a, Out<Vector> poly) {
+    if (const Outcome bad = SquareLast(a))
+        return bad;
+    if (a.rows() == std::numeric_limits<int32_t>::max())
+        return ErrOutOfMemory;
+    if (const Outcome bad = poly.resize(a.rows() + 1))
+        return bad;
+    return CharacteristicPolynomial(a.data(), a.rows(), poly.data());
+}
+
+} // namespace
+} // namespace qx
+
+using qx::InErr;
+using qx::Returned;
+
+int32_t Determinant_head(DBL2D a, const int32_t *matrixType, DBL *det, ErrorCode *err) {
+    return InErr(err, qx::Determinant<DBL2D>, a, *matrixType, det);
+}
+int32_t CxDeterminant_head(CDB2D a, const int32_t *matrixType, CDB *det, ErrorCode *err) {
+    return InErr(err, qx::Determinant<CDB2D>, a, *matrixType, det);
+}
+int32_t Rank_head(DBL2D a, const double *tolerance, int32_t *rank, ErrorCode *err) {
+    return InErr(err, qx::Rank<DBL2D>, a, *tolerance, rank);
+}
+int32_t CxRank_head(CDB2D a, const double *tolerance, int32_t *rank, ErrorCode *err) {
+    return InErr(err, qx::Rank<CDB2D>, a, *tolerance, rank);
+}
+int32_t CondNumber_head(DBL2D a, const int32_t *normType, DBL *cond, ErrorCode *err) {
+    return InErr(err, qx::Condition<DBL2D>, a, *normType, cond);
+}
+int32_t CxCondNumber_head(CDB2D a, const int32_t *normType, DBL *cond, ErrorCode *err) {
+    return InErr(err, qx::Condition<CDB2D>, a, *normType, cond);
+}
+int32_t Norm_head(DBL2D a, const int32_t *normType, DBL *norm, ErrorCode *err) {
+    return InErr(err, qx::Norm<DBL2D>, a, *normType, norm);
+}
+int32_t CxNorm_head(CDB2D a, const int32_t *normType, DBL *norm, ErrorCode *err) {
+    return InErr(err, qx::Norm<CDB2D>, a, *normType, norm);
+}
+int32_t Trace_head(DBL2D a, DBL *trace, ErrorCode *err) {
+    return InErr(err, qx::Trace<DBL2D>, a, trace);
+}
+int32_t CxTrace_head(CDB2D a, CDB *trace, ErrorCode *err) {
+    return InErr(err, qx::Trace<CDB2D>, a, trace);
+}
+
+int32_t DotProduct_head(DBL1D x, DBL1D y, DBL *dot, ErrorCode *err) {
+    return InErr(err, qx::DotProduct<DBL1D>, x, y, dot);
+}
+int32_t DotprodCx(CDB1D x, CDB1D y, CDB *dot, ErrorCode *err) {
+    return InErr(err, qx::DotProduct<CDB1D>, x, y, dot);
+}
+ErrorCode vectorNormH(DBL1D x, double p, DBL *norm) {
+    return Returned(qx::NormOfVector<DBL1D>, x, p, norm);
+}
+ErrorCode CxVectorNormH(CDB1D x, double p, DBL *norm) {
+    return Returned(qx::NormOfVector<CDB1D>, x, p, norm);
+}
+int32_t unitVector_head(DBL1D x, DBL *norm, ErrorCode *err) {
+    return InErr(err, qx::UnitVector<DBL1D>, x, 2.0, norm);
+}
+int32_t CxUnitVector_head(CDB1D x, DBL *norm, ErrorCode *err) {
+    return InErr(err, qx::UnitVector<CDB1D>, x, 2.0, norm);
+}
+int32_t unitVector80_head(DBL1D x, double p, DBL *norm, ErrorCode *err) {
+    return InErr(err, qx::UnitVector<DBL1D>, x, p, norm);
+}
+int32_t CxUnitVector80_head(CDB1D x, double p, DBL *norm, ErrorCode *err) {
+    return InErr(err, qx::UnitVector<CDB1D>, x, p, norm);
+}
+
+ErrorCode CheckSym_head(DBL2D a, double tolerance, int32_t relative, int32_t *isSymmetric) {
+    return Returned(qx::TestSymmetry, a, tolerance, relative, isSymmetric);
+}
+ErrorCode CxCheckSym_head(CDB2D a, double tolerance, int32_t relative, int32_t hermitian,
+                          int32_t *isSymmetric) {
+    return Returned(qx::CxTestSymmetry, a, tolerance, relative, hermitian, isSymmetric);
+}
+int32_t CheckPosdef_head(DBL2D a, int32_t *isPositiveDefinite, ErrorCode *err) {
+    return InErr(err, qx::TestDefiniteness<DBL2D>, a, isPositiveDefinite);
+}
+int32_t CxCheckPosdef_head(CDB2D a, int32_t *isPositiveDefinite, ErrorCode *err) {
+    return InErr(err, qx::TestDefiniteness<CDB2D>, a, isPositiveDefinite);
+}
+ErrorCode CheckPosSemiDef_head(DBL2D a, double tolerance, int32_t *isSemiDefinite, int32_t *rank) {
+    return Returned(qx::TestSemiDefiniteness<DBL2D>, a, tolerance, isSemiDefinite, rank);
+}
+ErrorCode CxCheckPosSemiDef_head(CDB2D a, double tolerance, int32_t *isSemiDefinite,
+                                 int32_t *rank) {
+    return Returned(qx::TestSemiDefiniteness<CDB2D>, a, tolerance, isSemiDefinite, rank);
+}
+
+int32_t MatrixCharacteristicPoly_head(DBL2D a, DBL1D poly, ErrorCode *err) {
+    return InErr(err, qx::Polynomial<DBL2D, DBL1D>, a, poly);
+}
+int32_t CxMatrixCharacteristicPoly_head(CDB2D a, CDB1D poly, ErrorCode *err) {
+    return InErr(err, qx::Polynomial<CDB2D, CDB1D>, a, poly);
+}

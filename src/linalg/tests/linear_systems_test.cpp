@@ -1,0 +1,423 @@
+#include "qx/linear_systems.h"
+
+#include "linalg/matrix.h"
+#include "linalg/systems/least_squares.h"
+#include "linalg/systems/lu.h"
+#include "linalg/tests/exact.h"
+#include "linalg/tests/filled.h"
+#include "linalg/tests/matrices.h"
+
+#include <gtest/gtest.h>
+
+#include <cstring>
+#include <limits>
+#include <thread>
+
+namespace {
+
+using qx::ElementType;
+using qx::operator*;
+using qx::operator+=;
+using qx::test::Deviation;
+using qx::test::Exact;
+using qx::test::Noise;
+
+typedef qx::test::Array1D<ElementType::DBL> DBLVector;
+typedef qx::test::Array1D<ElementType::CDB> CDBVector;
+typedef qx::test::Array1D<ElementType::I32> I32Vector;
+typedef qx::test::FilledDBL DBLMatrix;
+typedef qx::test::FilledCDB CDBMatrix;
+
+constexpr double inf = std::numeric_limits<double>::infinity();
+const double nan = std::numeric_limits<double>::quiet_NaN();
+
+std::vector<double> Reals(int n, uint64_t seed) {
+    Noise noise(seed);
+    std::vector<double> x;
+    for (int i = 0; i < n; ++i)
+        x.push_back(noise.symmetric());
+    return x;
+}
+std::vector<CDB> Complexes(int n, uint64_t seed) {
+    Noise noise(seed);
+    std::vector<CDB> x;
+    for (int i = 0; i < n; ++i)
+        x.push_back({noise.symmetric(), noise.symmetric()});
+    return x;
+}
+
+// |b - a x| / (|a| |x|) in units of n eps: the backward error of a solution.
+template <class T>
+double BackwardError(const std::vector<T> &a, int n, const std::vector<T> &b,
+                     const std::vector<T> &x) {
+    const int columns = static_cast<int>(b.size()) / n;
+    const Exact A(n, n, a.data()), X(n, columns, x.data());
+    const Exact residual = Exact(n, columns, b.data()) - A * X;
+    const long double scale = A.norm() * X.norm() * n * 0x1p-52L;
+    return scale == 0 ? 0 : static_cast<double>(residual.norm() / scale);
+}
+
+// Every regular kind of matrix, and orders on both sides of the panels and strips.
+TEST(LU, SolvesAndInvertsBackwardStably) {
+    for (const auto &kind : qx::test::MatrixKinds())
+        for (const int n : {1, 2, 5, 31, 33, 64, 97}) {
+            SCOPED_TRACE(testing::Message() << kind.name << " " << n);
+            const auto a = RealMatrix(kind, n, n);
+            const auto za = ComplexMatrix(kind, n, n);
+            const auto b = Reals(n, 5);
+            const auto zb = Complexes(n, 5);
+            std::vector<double> x(b.size());
+            std::vector<CDB> zx(zb.size());
+            const ErrorCode status = qx::SolveByLU(a.data(), n, b.data(), x.data());
+            if (status == 0 && std::isfinite(x[0])) {
+                EXPECT_LT(BackwardError(a, n, b, x), 4.0);
+            } else {
+                EXPECT_TRUE(status == 0 || status == ErrSingularMatrix);
+            }
+            if (qx::SolveByLU(za.data(), n, zb.data(), zx.data()) == 0 && std::isfinite(zx[0].re)) {
+                EXPECT_LT(BackwardError(za, n, zb, zx), 4.0);
+            }
+        }
+}
+
+// All right sides at once, as the inverse is made, and one by one: the same bits.
+template <class T>
+void ExpectStripsLikeSingles(const std::vector<T> &a, int n) {
+    std::vector<T> lu = a, inverse(a.size());
+    std::vector<int32_t> pivots(n);
+    int32_t parity;
+    ASSERT_EQ(qx::LUDecompose(lu.data(), n, n, pivots.data(), &parity), 0);
+    ASSERT_EQ(qx::InvertByLU(a.data(), n, inverse.data()), 0);
+    for (int j = 0; j < n; ++j) {
+        std::vector<T> column(n, T{});
+        reinterpret_cast<double &>(column[j]) = 1.0;
+        qx::LUSolve(lu.data(), pivots.data(), column.data(), n, 1, column.data());
+        for (int i = 0; i < n; ++i)
+            ASSERT_EQ(std::memcmp(&column[i], &inverse[i * n + j], sizeof(T)), 0) << i << " " << j;
+    }
+    EXPECT_LT(Deviation(Exact(n, n, a.data()) * Exact(n, n, inverse.data()), Exact::Identity(n)),
+              200.0);
+}
+TEST(LU, AnInverseHasTheBitsOfItsColumns) {
+    for (const int n : {1, 3, 8, 19, 45}) {
+        SCOPED_TRACE(n);
+        ExpectStripsLikeSingles(Reals(n * n, 3), n);
+        ExpectStripsLikeSingles(Complexes(n * n, 3), n);
+    }
+}
+
+// The order of arithmetic is the plain one whatever the panels do: with a row of numbers that
+// swallow each other the last bits tell it.
+TEST(LU, SubtractsTermsInAscendingOrder) {
+    const int n = 70;
+    std::vector<double> a(n * n, 0.0);
+    for (int i = 0; i < n; ++i)
+        a[i * n + i] = 1.0;
+    // Row n - 1 becomes 1 - 1e16 - 1 - 1 ... + 1e16: every 1 after the first huge term is lost.
+    for (int j = 0; j < n - 1; ++j) {
+        a[(n - 1) * n + j] = 1.0;
+        a[j * n + n - 1] = j == 0 ? 1e16 : j == n - 2 ? -1e16 : 1.0;
+    }
+    std::vector<int32_t> pivots(n);
+    int32_t parity;
+    EXPECT_EQ(qx::LUDecompose(a.data(), n, n, pivots.data(), &parity), WarnSingular);
+    EXPECT_EQ(a[n * n - 1], 0.0);
+}
+
+TEST(LU, TellsSingularityAndGoesOn) {
+    std::vector<double> a = {0, 0, 2, 0, 0, 3, 0, 5, 1};
+    std::vector<int32_t> pivots(3);
+    int32_t parity = 7;
+    EXPECT_EQ(qx::LUDecompose(a.data(), 3, 3, pivots.data(), &parity), WarnSingular);
+    EXPECT_EQ(pivots, (std::vector<int32_t>{0, 2, 2}));
+    EXPECT_EQ(parity, 1);
+    // Ties keep the earlier row, and NaN is never a pivot.
+    std::vector<double> ties = {-1, 2, 1, 3};
+    qx::LUDecompose(ties.data(), 2, 2, pivots.data(), &parity);
+    EXPECT_EQ(pivots[0], 0);
+    std::vector<double> withNaN = {nan, 2, 1, 3};
+    EXPECT_EQ(qx::LUDecompose(withNaN.data(), 2, 2, pivots.data(), &parity), WarnSingular);
+    EXPECT_EQ(pivots[0], 1);
+}
+
+TEST(LinearSystems, TheLastFailedCheckDecidesInOlderExports) {
+    ErrorCode err;
+    DBLMatrix a(2, 3);
+    DBLVector b(1), x(0);
+    EXPECT_EQ(EqsByLUDri_head(a.handle(), b.handle(), x.handle(), &err), 0);
+    EXPECT_EQ(err, ErrSizeMismatch);
+    DBLVector two(2);
+    EqsByLUDri_head(a.handle(), two.handle(), x.handle(), &err);
+    EXPECT_EQ(err, ErrNotSquare);
+    DBLMatrix none(0, 0);
+    DBLVector empty(0);
+    EqsByLUDri_head(none.handle(), empty.handle(), x.handle(), &err);
+    EXPECT_EQ(err, ErrEmptyInput);
+    I32Vector pivots({0, 5});
+    DBLMatrix lu(2, 2, {1, 0, 0, 1});
+    LULinEqs_head(lu.handle(), pivots.handle(), two.handle(), &err);
+    EXPECT_EQ(err, ErrIndexOutOfRange);
+    EXPECT_EQ(two.size(), 0);
+}
+
+TEST(LinearSystems, SingularAndNonFiniteSystems) {
+    ErrorCode err;
+    DBLMatrix zero(1, 1, {0.0});
+    DBLVector b({1.0}), x(0);
+    EqsByLUDri_head(zero.handle(), b.handle(), x.handle(), &err);
+    EXPECT_EQ(err, ErrSingularMatrix);
+    EXPECT_EQ(x.size(), 0);
+    DBLMatrix unsolvable(1, 1, {inf});
+    GenLinEqs_head(unsolvable.handle(), b.handle(), x.handle(), &err);
+    EXPECT_EQ(err, ErrNonFiniteInput);
+    DBLMatrix fine(1, 1, {2.0}), right(1, 1, {1.0}), out(1, 1, {1.0});
+    EXPECT_EQ(EqsSetByLUDri_head(fine.handle(), right.handle(), out.handle()), ErrNotAvailable);
+    EXPECT_EQ(out.rows(), 0);
+    CDBMatrix zfine(1, 1), zright(1, 1), zout(1, 1);
+    EXPECT_EQ(CxEqsSetByLUDri_head(zfine.handle(), zright.handle(), zout.handle()),
+              ErrNotAvailable);
+}
+
+// The minimum-norm solution: x is in the row space, and the residual is orthogonal to the columns.
+template <class T>
+void ExpectLeastSquares(const std::vector<T> &a, int m, int n, const std::vector<T> &b,
+                        const std::vector<T> &x) {
+    const Exact A(m, n, a.data()), X(n, 1, x.data()), B(m, 1, b.data());
+    const Exact residual = B - A * X;
+    EXPECT_LT(static_cast<double>((A.adjoint() * residual).norm() / (A.norm() * B.norm())),
+              1e-14 * (m + n));
+}
+TEST(LeastSquares, SatisfyTheNormalEquations) {
+    for (const auto &[m, n] : {std::pair(7, 3), {3, 7}, {40, 40}, {1, 1}, {50, 20}}) {
+        SCOPED_TRACE(testing::Message() << m << " by " << n);
+        const auto a = Reals(m * n, 1), b = Reals(m, 2);
+        const auto za = Complexes(m * n, 1), zb = Complexes(m, 2);
+        std::vector<double> x(n), pseudo(n * m);
+        std::vector<CDB> zx(n);
+        ASSERT_EQ(qx::SolveBySVD(a.data(), m, n, b.data(), 1, x.data(), -1.0), 0);
+        ExpectLeastSquares(a, m, n, b, x);
+        ASSERT_EQ(qx::SolveBySVD(za.data(), m, n, zb.data(), 1, zx.data(), -1.0), 0);
+        ExpectLeastSquares(za, m, n, zb, zx);
+        // The four conditions of Penrose, of which the products and their symmetry tell all.
+        ASSERT_EQ(qx::PseudoInverseMatrix(a.data(), m, n, -1.0, pseudo.data()), 0);
+        const Exact A(m, n, a.data()), P(n, m, pseudo.data());
+        EXPECT_LT(Deviation(A * P * A, A), 100.0);
+        EXPECT_LT(Deviation(P * A * P, P), 100.0);
+        EXPECT_LT(Deviation((A * P).adjoint(), A * P), 100.0);
+        EXPECT_LT(Deviation((P * A).adjoint(), P * A), 100.0);
+    }
+}
+
+// x + y = 2, twice: of all solutions (1, 1) is the shortest.
+TEST(LeastSquares, TellALackOfRankOrDoNot) {
+    ErrorCode err = 1;
+    DBLMatrix a(2, 2, {1, 1, 1, 1}), sides(2, 1, {2, 2}), solutions(0, 0);
+    DBLVector b({2, 2}), x(0), work(0);
+    GenLinEqs_head(a.handle(), b.handle(), x.handle(), &err);
+    EXPECT_EQ(err, 0);
+    EXPECT_NEAR(x[0], 1.0, 1e-15);
+    EXPECT_NEAR(x[1], 1.0, 1e-15);
+    EXPECT_EQ(EqsSetBySVDDri_head(a.handle(), sides.handle(), solutions.handle()),
+              WarnRankDeficient);
+    EXPECT_NEAR(solutions.at(1, 0), 1.0, 1e-15);
+    EXPECT_EQ(GenLinEqs2010_head(a.handle(), b.handle(), x.handle(), -1.0, work.handle()), 0);
+    EXPECT_NEAR(x[1], 1.0, 1e-15);
+    EXPECT_EQ(work.size(), 2 * 5 + 4 + 2 + 4);
+    EXPECT_EQ(GenLinEqsbySVD2011_head(a.handle(), b.handle(), x.handle(), -1.0, 3, work.handle()),
+              0);
+    EXPECT_NEAR(x[0], 1.0, 1e-15);
+    EXPECT_EQ(work.size(), 2 * 5 + 4 + 2 + 4 + 4);
+    EXPECT_EQ(GenLinEqsbySVD2011_head(a.handle(), b.handle(), x.handle(), -1.0, -1, work.handle()),
+              0);
+    EXPECT_EQ(x[0], 0.0);
+}
+
+// The cut of the plain method is max(m, n) times the tolerance, that of the refined one is not.
+TEST(LeastSquares, CutSingularValuesByTheirTolerance) {
+    DBLMatrix a(2, 2, {1, 0, 0, 0.15});
+    DBLVector b({1, 0.15}), x(0), work(0);
+    ErrorCode err;
+    GenLinEqs82_head(a.handle(), b.handle(), x.handle(), 0.1, &err);
+    EXPECT_NEAR(x[1], 0.0, 1e-15); // 0.15 is below 2 * 0.1
+    GenLinEqsbySVD2011_head(a.handle(), b.handle(), x.handle(), 0.1, 1, work.handle());
+    EXPECT_NEAR(x[1], 1.0, 1e-15);
+    GenLinEqsbySVD2011_head(a.handle(), b.handle(), x.handle(), 0.2, 1, work.handle());
+    EXPECT_EQ(x[1], 0.0);
+}
+
+// Hilbert's matrix of order 5 has the condition number 5e5: one refinement is worth some digits.
+TEST(LeastSquares, RefinementReducesTheResidual) {
+    const int n = 5;
+    std::vector<double> a, b(n, 0.0);
+    for (int i = 0; i < n; ++i)
+        for (int j = 0; j < n; ++j)
+            a.push_back(1.0 / (i + j + 1));
+    for (int i = 0; i < n; ++i)
+        for (int j = 0; j < n; ++j)
+            b[i] += a[i * n + j];
+    std::vector<double> once(n), thrice(n), work(1000);
+    ASSERT_EQ(qx::SolveBySVDRefined(work.data(), a.data(), n, n, b.data(), once.data(), -1.0, 1),
+              0);
+    ASSERT_EQ(qx::SolveBySVDRefined(work.data(), a.data(), n, n, b.data(), thrice.data(), -1.0, 3),
+              0);
+    EXPECT_LE(BackwardError(a, n, b, thrice), BackwardError(a, n, b, once));
+    EXPECT_LT(BackwardError(a, n, b, thrice), 0.5);
+}
+
+// b^H b + 1 of noise.
+std::vector<CDB> PositiveDefinite(int n) {
+    const auto b = Complexes(n * n, 9);
+    std::vector<CDB> a(n * n, CDB{0.0, 0.0});
+    for (int i = 0; i < n; ++i)
+        for (int j = 0; j < n; ++j) {
+            for (int k = 0; k < n; ++k)
+                a[i * n + j] += qx::Conj(b[k * n + i]) * b[k * n + j];
+            a[i * n + j] += CDB{i == j ? 1.0 : 0.0, 0.0};
+        }
+    return a;
+}
+
+TEST(Cholesky, SolvesFromEitherTriangle) {
+    for (const int n : {1, 2, 9, 40}) {
+        SCOPED_TRACE(n);
+        const auto a = PositiveDefinite(n);
+        const auto b = Complexes(3 * n, 4);
+        // The other triangle holds something else, and is not read.
+        for (const int useUpper : {0, 1}) {
+            auto half = a;
+            for (int i = 0; i < n; ++i)
+                for (int j = 0; j < n; ++j)
+                    if (useUpper != 0 ? j < i : j > i)
+                        half[i * n + j] = {1.0, 1.0};
+            const CDBMatrix A(n, n, half), B(n, 3, b), X(0, 0);
+            ASSERT_EQ(CxEqsSetByCholeskyDri_head(A.handle(), useUpper, B.handle(), X.handle()), 0);
+            EXPECT_LT(BackwardError(a, n, b, X.values()), 4.0);
+        }
+    }
+    DBLMatrix indefinite(2, 2, {1, 2, 2, 1});
+    DBLVector b({1, 1}), x(0);
+    ErrorCode err;
+    EqsByCholeskyDri_head(indefinite.handle(), b.handle(), x.handle(), &err);
+    EXPECT_EQ(err, ErrNotPositiveDefinite);
+    DBLVector fourElements(4);
+    CholeskyLinEqs_head(fourElements.handle(), b.handle(), &err);
+    EXPECT_EQ(err, ErrNotSquare);
+}
+
+template <class Matrix, class T, class Export>
+void ExpectTriangularSolutions(int n, int triangle, std::vector<T> a, const std::vector<T> &b,
+                               Export solve) {
+    const Matrix B(n, 3, b), X(0, 0);
+    for (int i = 0; i < n; ++i) {
+        reinterpret_cast<double &>(a[i * n + i]) -= 4.0; // a negative diagonal is no failure
+        for (int j = 0; j < n; ++j)
+            if (triangle == 0 ? j > i : j < i)
+                reinterpret_cast<double &>(a[i * n + j]) = nan; // never read
+    }
+    const Matrix A(n, n, a);
+    ASSERT_EQ(solve(A.handle(), triangle, B.handle(), X.handle()), 0);
+    for (int i = 0; i < n; ++i)
+        for (int j = 0; j < n; ++j)
+            if (triangle == 0 ? j > i : j < i)
+                a[i * n + j] = T{};
+    EXPECT_LT(BackwardError(a, n, b, X.values()), 2.0);
+}
+TEST(Triangular, SolvesForAllRightSides) {
+    for (const int n : {1, 2, 7, 30})
+        for (const int triangle : {0, 1}) {
+            SCOPED_TRACE(testing::Message() << n << " " << triangle);
+            ExpectTriangularSolutions<DBLMatrix>(n, triangle, Reals(n * n, 1), Reals(3 * n, 2),
+                                                 TriEqsSetDri_head);
+            ExpectTriangularSolutions<CDBMatrix>(n, triangle, Complexes(n * n, 1),
+                                                 Complexes(3 * n, 2), CxTriEqsSetDri_head);
+        }
+    ErrorCode err;
+    DBLVector packed({1, 1, 1e-17}), b({1, 1});
+    const PackedTriangle a = {packed.handle(), 0}, wrong = {packed.handle(), 2};
+    TriLinEqs_head(&a, b.handle(), &err);
+    EXPECT_EQ(err, ErrSingularMatrix);
+    DBLVector again({1, 1});
+    TriLinEqs_head(&wrong, again.handle(), &err);
+    EXPECT_EQ(err, ErrInvalidSelector);
+}
+
+TEST(Banded, SolvesLikeTheFullMatrix) {
+    const int n = 12, lower = 2, upper = 1;
+    const auto diagonals = Complexes((lower + upper + 1) * n, 1);
+    const auto b = Complexes(n, 2);
+    std::vector<CDB> full(n * n, CDB{0.0, 0.0});
+    for (int i = 0; i < n; ++i)
+        for (int j = std::max(0, i - lower); j <= std::min(n - 1, i + upper); ++j)
+            full[i * n + j] = diagonals[(upper + i - j) * n + j];
+    const CDBMatrix band(lower + upper + 1, n, diagonals);
+    const CDBVector x(b);
+    ASSERT_EQ(CxBandEqsDriH(band.handle(), x.handle(), lower, upper), 0);
+    EXPECT_LT(BackwardError(full, n, b, x.values()), 4.0);
+
+    EXPECT_EQ(CxBandEqsDriH(band.handle(), x.handle(), lower, upper + 1), ErrSizesDisagree);
+    CDBVector tooShort(n - 1);
+    EXPECT_EQ(CxBandEqsDriH(band.handle(), tooShort.handle(), lower, upper), ErrBandVectorSize);
+    DBLMatrix two(2, 1, {1, 1}), zero(1, 2, {0, 0});
+    DBLVector one({1}), ones({1, 1});
+    EXPECT_EQ(BandEqsDriH(two.handle(), one.handle(), 2, -1), ErrSizesDisagree);
+    EXPECT_EQ(BandEqsDriH(zero.handle(), ones.handle(), 0, 0), ErrSingularMatrix);
+}
+
+TEST(Tridiagonal, FactorsSolveForMatrixAndTranspose) {
+    const int n = 20;
+    const auto lower = Reals(n - 1, 1), diagonal = Reals(n, 2), upper = Reals(n - 1, 3);
+    const auto b = Reals(2 * n, 4);
+    DBLVector l(lower), d(diagonal), u(upper), u2(0);
+    I32Vector pivots(0);
+    ASSERT_EQ(TriDiagLU_head(l.handle(), d.handle(), u.handle(), u2.handle(), pivots.handle()), 0);
+    for (const int transposed : {0, 1}) {
+        std::vector<double> full(n * n, 0.0);
+        for (int i = 0; i < n; ++i) {
+            full[i * n + i] = diagonal[i];
+            if (i + 1 < n) {
+                full[(i + transposed) * n + i + 1 - transposed] = upper[i];
+                full[(i + 1 - transposed) * n + i + transposed] = lower[i];
+            }
+        }
+        const DBLMatrix x(n, 2, b);
+        ASSERT_EQ(TriDiagEqsSetByLU_head(transposed, l.handle(), d.handle(), u.handle(),
+                                         u2.handle(), pivots.handle(), x.handle()),
+                  0);
+        EXPECT_LT(BackwardError(full, n, b, x.values()), 4.0);
+    }
+    DBLVector one({1}), two({1, 1}), out(0);
+    I32Vector none(0);
+    EXPECT_EQ(TriDiagLU_head(one.handle(), two.handle(), one.handle(), out.handle(), none.handle()),
+              ErrFewerThanThree);
+    // A pivot that points elsewhere would make the solver read outside of b.
+    pivots.data()[n - 1] = n + 1;
+    DBLVector x(n);
+    EXPECT_EQ(TriDiagEqsByLU_head(0, l.handle(), d.handle(), u.handle(), u2.handle(),
+                                  pivots.handle(), x.handle()),
+              ErrIndexOutOfRange);
+    DBLVector z1({0, 0}), z2({0, 1, 1}), z3({0, 0}), z4(0);
+    EXPECT_EQ(TriDiagLU_head(z1.handle(), z2.handle(), z3.handle(), z4.handle(), none.handle()),
+              WarnSingular);
+}
+
+TEST(LinearSystems, OfDifferentThreadsDoNotDisturbEachOther) {
+    const int n = 120;
+    std::vector<std::thread> threads;
+    std::vector<int> wrong(8, 0);
+    for (int t = 0; t < 8; ++t)
+        threads.emplace_back([&wrong, t] {
+            const auto a = Reals(n * n, 10 + t), b = Reals(n, 20 + t);
+            std::vector<double> first(n), x(n);
+            qx::SolveByLU(a.data(), n, b.data(), first.data());
+            for (int round = 0; round < 10; ++round) {
+                qx::SolveByLU(a.data(), n, b.data(), x.data());
+                wrong[t] += x != first;
+            }
+            wrong[t] += !(BackwardError(a, n, b, first) < 4.0);
+        });
+    for (std::thread &thread : threads)
+        thread.join();
+    EXPECT_EQ(wrong, std::vector<int>(8, 0));
+}
+
+} // namespace
