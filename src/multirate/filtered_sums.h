@@ -104,10 +104,13 @@ private:
     }
 
     ErrorCode prepare(int32_t periods) {
-        // A chunk's samples stay in the cache, and its rows are long enough for the widest lanes.
-        constexpr int32_t samplesAtOnce = 4096, shortestRow = 64;
+        // A chunk's samples stay in the cache, unless its windows are too long: then it is as long
+        // as they are, since each chunk arranges the samples of its windows anew. Its rows are long
+        // enough for the widest lanes.
+        constexpr int64_t samplesAtOnce = 4096, shortestRow = 64;
         rows_ = static_cast<int32_t>(std::min<int64_t>(rhythm_.advance, span_));
-        chunk_ = std::min(periods, std::max(shortestRow, samplesAtOnce / rows_));
+        chunk_ = static_cast<int32_t>(std::min<int64_t>(
+            periods, std::max({shortestRow, samplesAtOnce / rows_, span_ / rhythm_.advance})));
         pitch_ = (span_ + rhythm_.advance - 1) / rhythm_.advance + paddedWidth(chunk_) / parts;
         const int32_t sums = rhythm_.period == 1 ? 0 : rowsAtOnce * paddedWidth(chunk_);
         if (const ErrorCode failed = rowsMemory_.allocate(parts * rows_ * pitch_))

@@ -180,10 +180,10 @@ TEST(Decimation, FIRStreamsAreTheDefinitionInBlocksOfAnySize) {
         int32_t factor, taps, delay, firstPhase;
     };
     const Case cases[] = {
-        {Interpolated, 1, 9, 0, 0}, {Interpolated, 5, 12, 30, 0}, {Interpolated, 40, 1, 699, 0},
-        {Interpolator, 1, 8, 3, 0}, {Interpolator, 4, 33, 16, 0}, {Interpolator, 7, 3, 250, 0},
-        {Decimator, 1, 6, 0, 0},    {Decimator, 4, 33, 4, 2},     {Decimator, 10, 25, 1, 9},
-        {Decimator, 50, 7, 0, 49},
+        {Interpolated, 1, 9, 0, 0},   {Interpolated, 5, 12, 30, 0}, {Interpolated, 40, 1, 699, 0},
+        {Interpolated, 97, 5, 0, 0},  {Interpolator, 1, 8, 3, 0},   {Interpolator, 4, 33, 16, 0},
+        {Interpolator, 7, 3, 250, 0}, {Decimator, 1, 6, 0, 0},      {Decimator, 4, 33, 4, 2},
+        {Decimator, 10, 25, 1, 9},    {Decimator, 50, 7, 0, 49},
     };
     for (const Case &c : cases) {
         SCOPED_TRACE(testing::Message() << c.kind << ", factor " << c.factor);
@@ -401,6 +401,16 @@ TEST(Decimation, GroupsOfAStreamAreSummed) {
                   expected);
         EXPECT_EQ(imaginary, expected);
     }
+    // A count that no group can have is taken as its rest.
+    for (const int32_t wrong : {7, -1}) {
+        Array1D<DBL> b{1, 2, 4, 8, 16};
+        double sum = 100;
+        int32_t count = wrong, outCount;
+        EXPECT_EQ(ReDecimatedMovingAverageH(b.handle(), 4, &sum, &count, 0, &outCount), 0);
+        EXPECT_EQ(outCount, 2);
+        EXPECT_EQ(b[0], 101);
+        EXPECT_EQ(count, 0);
+    }
 }
 
 TEST(Decimation, CascadedMovingSumsSizeTheirOwnState) {
@@ -487,8 +497,10 @@ TEST(Decimation, ModulatorsShiftAStreamInFrequency) {
                 const long double angle =
                     startPhase + 6.283185307179586476925L * (turns - std::floor(turns));
                 const std::complex<long double> w(std::cos(angle), std::sin(angle));
-                ASSERT_LE(std::abs(Get(z)[static_cast<std::size_t>(i)] - x[at] * w), 1.1e-11L) << at;
-                ASSERT_LE(std::abs(Get(y)[static_cast<std::size_t>(i)] - x[at].real() * w), 1.1e-11L);
+                ASSERT_LE(std::abs(Get(z)[static_cast<std::size_t>(i)] - x[at] * w), 1.1e-11L)
+                    << at;
+                ASSERT_LE(std::abs(Get(y)[static_cast<std::size_t>(i)] - x[at].real() * w),
+                          1.1e-11L);
             }
             EXPECT_GE(phase, 0);
             EXPECT_LT(phase, 6.2832);

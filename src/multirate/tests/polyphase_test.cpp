@@ -143,6 +143,22 @@ TYPED_TEST(Polyphase, BlocksOfAnySizeGiveTheBitsOfOne) {
     }
 }
 
+// A block that is worked off in several pieces, with short and with long windows.
+TEST(Polyphase, LongBlocksGiveTheSameBits) {
+    for (const Setting &setting :
+         {Setting{SameRate, 1, 1, 5000, false}, Setting{Interpolate, 2, 1, 31, true},
+          Setting{Decimate, 1, 5, 44, false}, Setting{Rational, 16, 15, 99, true}}) {
+        SCOPED_TRACE(setting);
+        const Signal x = NoiseSignal(12000, 8, true);
+        const Signal h = NoiseSignal(setting.taps, 9, false);
+        Stream<CSG> whole(setting, h, 1), halves(setting, h, 1);
+        const Signal expected = whole.filter(x);
+        Signal y = halves.filter(Part(x, 0, 4099));
+        Append(y, halves.filter(Part(x, 4099, 12000 - 4099)));
+        EXPECT_TRUE(SameBits(y, expected));
+    }
+}
+
 TEST(Polyphase, IsTheSumOfSciPysUpfirdn) {
     const std::vector<SciPyCase> cases = SciPyCases("upfirdn");
     ASSERT_EQ(cases.size(), 6U);
