@@ -55,6 +55,8 @@ template <ElementType Code>
 int32_t AverageStream(typename Element<Code>::type *x, int32_t n, int32_t factor, int32_t *start,
                       int32_t *partialCount, typename Element<Code>::type *partialSum) {
     typedef typename Element<Code>::type T;
+    if (n < 1) // nothing comes and nothing can go, whatever the caller holds as the part's count
+        return 0;
     int32_t outputs = 0;
     int32_t used = std::min(*start, n);
     if (*partialCount > 0) {

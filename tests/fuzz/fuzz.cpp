@@ -125,19 +125,25 @@ struct Scenario {
     bool isUndisturbed() const { return refuseAt == 0 && allocationFails == 0 && workspace == 0; }
 };
 
-int SomeAlias(Random &random, const Thunk &thunk, std::size_t at) {
-    const Parameter &parameter = thunk.parameters[at];
-    std::vector<int> same;
-    for (std::size_t i = 0; i < at; ++i) {
-        const Parameter &other = thunk.parameters[i];
-        // One of the two is an output, and not both.
-        if (other.kind == parameter.kind && other.element == parameter.element &&
-            other.isOut != parameter.isOut)
-            same.push_back(static_cast<int>(i));
-    }
-    return same.empty()
-               ? -1
-               : same[static_cast<std::size_t>(random.below(static_cast<int32_t>(same.size())))];
+// An array argument before `at` whose handle it may share: one of the two is an output. Arrays that
+// share the handle of a third do not come into question, so that no two outputs are one.
+int SomeAlias(Random &random, const Scenario &scenario, std::size_t at) {
+    const std::vector<Parameter> &parameters = scenario.thunk->parameters;
+    const auto isShared = [&](std::size_t i) {
+        return std::any_of(scenario.arguments.begin(), scenario.arguments.end(),
+                           [&](const Argument &a) { return a.aliasOf == static_cast<int>(i); });
+    };
+    std::vector<int> candidates;
+    for (std::size_t i = 0; i < at; ++i)
+        if (parameters[i].kind == parameters[at].kind &&
+            parameters[i].element == parameters[at].element &&
+            parameters[i].isOut != parameters[at].isOut && scenario.arguments[i].aliasOf < 0 &&
+            !isShared(i))
+            candidates.push_back(static_cast<int>(i));
+    if (candidates.empty())
+        return -1;
+    return candidates[static_cast<std::size_t>(
+        random.below(static_cast<int32_t>(candidates.size())))];
 }
 
 Argument SomeArgument(Random &random, const Parameter &parameter, const Sizes &sizes,
@@ -182,7 +188,7 @@ Scenario SomeScenario(Random &random, const Thunk &thunk) {
         if (IsKept(thunk.name, Oddity::TimeFollowsNumber))
             argument.whole %= 2000;
         if (shares && parameter.isArray()) {
-            argument.aliasOf = SomeAlias(random, thunk, i);
+            argument.aliasOf = SomeAlias(random, scenario, i);
             if (argument.aliasOf >= 0) {
                 const int aliasOf = argument.aliasOf;
                 argument = scenario.arguments[static_cast<std::size_t>(aliasOf)];
@@ -398,8 +404,9 @@ private:
     void checkBlocks() const {
         try {
             CheckBlocks();
-        } catch (const std::exception &error) {
+        } catch (const std::exception &error) { // what comes after it would tell nothing
             Tell("%s", error.what());
+            std::_Exit(3);
         }
         for (std::size_t i = 0; i < thunk_.parameters.size(); ++i) {
             const Parameter &parameter = thunk_.parameters[i];

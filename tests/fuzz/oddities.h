@@ -26,6 +26,7 @@ constexpr KeptOddity keptOddities[] = {
     {"AutoCorrelation", Oddity::SizeBeyondBlock, "the resize is not looked at"},
     {"AutoCorrelation80", Oddity::SizeBeyondBlock, "the resize is not looked at"},
     {"Deconvolution", Oddity::SizeBeyondBlock, "the resize is not looked at"},
+    {"ReComplexModulatorH", Oddity::OldContentStays, "where x is empty"},
     {"ReDZTH", Oddity::TimeFollowsNumber, "S transforms, however few values there are"},
     {"ReDZTH_IDP", Oddity::TimeFollowsNumber, "as ReDZTH"},
     {"CxDZTH", Oddity::TimeFollowsNumber, "as ReDZTH"},
