@@ -71,7 +71,8 @@ int32_t AverageStream(typename Element<Code>::type *x, int32_t n, int32_t factor
         *start -= n;
         return 0;
     }
-    for (; n - used >= factor; used += factor)
+    // The bound holds by itself unless the caller's count does not fit its start.
+    for (; n - used >= factor && outputs < n; used += factor)
         x[outputs++] = Divided<Code>(Summed<Code>(T{}, x + used, factor), factor);
     *partialCount = n - used;
     *partialSum = Summed<Code>(T{}, x + used, *partialCount);
