@@ -21,6 +21,8 @@
 #include "qx/polyphase.h"
 #include "qx/rational_resampling.h"
 #include "qx/resampling.h"
+#include "qx/scaling.h"
+#include "qx/shuffling.h"
 #include "qx/special.h"
 #include "qx/special_matrices.h"
 #include "qx/spectra.h"
