@@ -4,6 +4,7 @@
 /* Every export of the module. */
 
 #include "qx/anova.h"
+#include "qx/calculus.h"
 #include "qx/chirp_z.h"
 #include "qx/convolution.h"
 #include "qx/convolution_2d.h"
@@ -17,6 +18,7 @@
 #include "qx/matrix_factorisations.h"
 #include "qx/matrix_products.h"
 #include "qx/matrix_properties.h"
+#include "qx/interpolation.h"
 #include "qx/noise.h"
 #include "qx/polyphase.h"
 #include "qx/rational_resampling.h"
