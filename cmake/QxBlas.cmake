@@ -12,5 +12,6 @@ endforeach()
 get_target_property(archive qxlapack IMPORTED_LOCATION)
 cmake_path(GET archive PARENT_PATH folder)
 set_target_properties(qxlapack PROPERTIES INTERFACE_INCLUDE_DIRECTORIES ${folder}/include)
-target_link_libraries(qxlapack INTERFACE qxopenblas)
+# The core has what compiled Fortran asks for.
+target_link_libraries(qxlapack INTERFACE qxopenblas qxcore)
 target_link_libraries(qxopenblas INTERFACE qxlibm)

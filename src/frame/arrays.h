@@ -173,6 +173,9 @@ public:
         return Outcome::OfHost(hostStatus);
     }
 
+    // Rows become columns: the elements have been rearranged where they stand.
+    void exchangeSizes() requires(dimensions == 2) { setSizes(this->cols(), this->rows()); }
+
     // The sizes become 0 even where the host refuses.
     void empty() {
         reshape(static_cast<int32_t>(EmptyCode), 0);

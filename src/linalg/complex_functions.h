@@ -18,6 +18,16 @@ inline CDB SquareRoot(CDB z) {
     return {std::fabs(z.im) / (2.0 * t), std::copysign(t, z.im)};
 }
 
+// log |z| + i arg z; -infinity for 0.
+inline CDB Logarithm(CDB z) {
+    return {std::log(z.re * z.re + z.im * z.im) * 0.5, std::atan2(z.im, z.re)};
+}
+inline double Exponential(double x) { return std::exp(x); }
+inline CDB Exponential(CDB z) {
+    const double modulus = std::exp(z.re);
+    return {modulus * std::cos(z.im), modulus * std::sin(z.im)};
+}
+
 } // namespace qx
 
 #endif

@@ -1,5 +1,6 @@
 #include "linalg/lapack.h"
 
+#include "linalg/aligned.h"
 #include "linalg/blas_memory.h"
 
 // LAPACK's complex elements are ours.
@@ -83,6 +84,77 @@ int32_t SolveTridiagonal(bool transposed, int32_t n, int32_t rightSides, const D
     int32_t info = 0;
     LAPACK_dgttrs(transposed ? "T" : "N", &n, &rightSides, lower, diagonal, upper, upper2, pivots,
                   b, &n, &info);
+    return info;
+}
+
+namespace {
+
+// A work query answers in the first element.
+int32_t Answer(const DBL *work) { return static_cast<int32_t>(*work); }
+int32_t Answer(const CDB *work) { return static_cast<int32_t>(work->re); }
+
+char Job(const void *vectors) { return vectors != nullptr ? 'V' : 'N'; }
+
+} // namespace
+
+int32_t Schur(int32_t n, DBL *t, CDB *w, DBL *z) {
+    const BlasMemory memory;
+    AlignedScratch<ElementType::DBL> values, work;
+    if (!memory || values.allocate(2 * int64_t{n}) != 0)
+        return noMemory;
+    const char job = Job(z);
+    DBL size, *const wi = values.data() + n;
+    int32_t info = 0, selected = 0, length = -1;
+    LAPACK_dgees(&job, "N", nullptr, &n, t, &n, &selected, values.data(), wi, z, &n, &size, &length,
+                 nullptr, &info);
+    length = Answer(&size);
+    if (work.allocate(length) != 0)
+        return noMemory;
+    LAPACK_dgees(&job, "N", nullptr, &n, t, &n, &selected, values.data(), wi, z, &n, work.data(),
+                 &length, nullptr, &info);
+    for (int32_t i = 0; i < n; ++i)
+        w[i] = {values[i], wi[i]};
+    return info;
+}
+int32_t Schur(int32_t n, CDB *t, CDB *w, CDB *z) {
+    const BlasMemory memory;
+    AlignedScratch<ElementType::DBL> real;
+    AlignedScratch<ElementType::CDB> work, values;
+    if (!memory || real.allocate(n) != 0 || values.allocate(n) != 0)
+        return noMemory;
+    const char job = Job(z);
+    CDB size;
+    int32_t info = 0, selected = 0, length = -1;
+    LAPACK_zgees(&job, "N", nullptr, &n, t, &n, &selected, values.data(), z, &n, &size, &length,
+                 real.data(), nullptr, &info);
+    length = Answer(&size);
+    if (work.allocate(length) != 0)
+        return noMemory;
+    LAPACK_zgees(&job, "N", nullptr, &n, t, &n, &selected, values.data(), z, &n, work.data(),
+                 &length, real.data(), nullptr, &info);
+    for (int32_t i = 0; i < n; ++i)
+        w[i] = values[i];
+    return info;
+}
+
+int32_t MoveInSchur(int32_t n, DBL *t, DBL *z, int32_t from, int32_t to) {
+    const BlasMemory memory;
+    AlignedScratch<ElementType::DBL> work;
+    if (!memory || work.allocate(n) != 0)
+        return noMemory;
+    const char job = Job(z);
+    int32_t info = 0, first = from + 1, last = to + 1;
+    LAPACK_dtrexc(&job, &n, t, &n, z, &n, &first, &last, work.data(), &info);
+    return info;
+}
+int32_t MoveInSchur(int32_t n, CDB *t, CDB *z, int32_t from, int32_t to) {
+    const BlasMemory memory;
+    if (!memory)
+        return noMemory;
+    const char job = Job(z);
+    const int32_t first = from + 1, last = to + 1;
+    int32_t info = 0;
+    LAPACK_ztrexc(&job, &n, t, &n, z, &n, &first, &last, &info);
     return info;
 }
 

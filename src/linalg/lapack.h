@@ -45,6 +45,17 @@ int32_t SolveTridiagonal(bool transposed, int32_t n, int32_t rightSides, const D
                          const DBL *diagonal, const DBL *upper, const DBL *upper2,
                          const I32 *pivots, DBL *b);
 
+// What follows takes scratch memory of its own for LAPACK's work. All matrices are of order n and
+// stand in AlignedScratch.
+
+// Schur form of t: t becomes triangular, or for real elements quasi-triangular, w its eigenvalues,
+// and z its Schur vectors; with z null there are none. Above 0: no convergence.
+int32_t Schur(int32_t n, DBL *t, CDB *w, DBL *z);
+int32_t Schur(int32_t n, CDB *t, CDB *w, CDB *z);
+// Moves the block at row `from` of a Schur form to row `to`, rows counted from 0.
+int32_t MoveInSchur(int32_t n, DBL *t, DBL *z, int32_t from, int32_t to);
+int32_t MoveInSchur(int32_t n, CDB *t, CDB *z, int32_t from, int32_t to);
+
 } // namespace lapack
 
 } // namespace qx

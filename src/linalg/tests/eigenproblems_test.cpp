@@ -2,6 +2,7 @@
 #include "linalg/eigenproblems/symmetric.h"
 #include "linalg/factorisations/balance.h"
 #include "linalg/tests/exact.h"
+#include "linalg/tests/host_matrix.h"
 #include "linalg/tests/matrices.h"
 #include "qx/qx.h"
 
@@ -103,6 +104,75 @@ TEST(SymmetricEigen, GivesTheMatrixBackFromOrthonormalVectors) {
             SCOPED_TRACE(testing::Message() << kind.name << ", order " << n);
             ExpectSpectralDecomposition(RealMatrix(kind, n, n), n);
             ExpectSpectralDecomposition(ComplexMatrix(kind, n, n), n);
+        }
+}
+
+TEST(Eigenproblems, ExportsFollowTheirSelectors) {
+    const DBL2DArray rotation(2, 2, {0.0, -1.0, 1.0, 0.0});
+    CDBArray values;
+    CDB2DArray vectors;
+    ErrorCode err;
+    int32_t output = 1;
+    EigenValueVector_head(rotation.handle(), &output, values.handle(), vectors.handle(), &err);
+    EXPECT_EQ(err, 0);
+    EXPECT_NEAR(values[0].im, 1.0, 1e-15);
+    EXPECT_NEAR(values[1].im, -1.0, 1e-15);
+    const DBL2DArray single(1, 1, {-7.0});
+    EigenValueVector_head(single.handle(), &output, values.handle(), vectors.handle(), &err);
+    EXPECT_EQ(values[0].re, -7.0);
+    EXPECT_EQ(vectors[0].re, 1.0);
+    output = 0;
+    EigenValueVector_head(rotation.handle(), &output, values.handle(), vectors.handle(), &err);
+    EXPECT_EQ(err, 0);
+    EXPECT_EQ(vectors.rows() + vectors.cols(), 0);
+    output = 2;
+    EigenValueVector_head(rotation.handle(), &output, values.handle(), vectors.handle(), &err);
+    EXPECT_EQ(err, ErrInvalidSelector);
+    const DBL2DArray bad(2, 2, {1.0, std::numeric_limits<double>::quiet_NaN(), 0.0, 1.0});
+    output = 1;
+    EigenValueVector_head(bad.handle(), &output, values.handle(), vectors.handle(), &err);
+    EXPECT_EQ(err, ErrNonFiniteInput);
+    EXPECT_EQ(values.size() + vectors.rows(), 0);
+    const DBL2DArray symmetric(2, 2, {2.0, 9.0, 1.0, 2.0}); // the upper triangle is not read
+    DBLArray real;
+    output = 0;
+    SymEvectorEvalue_head(symmetric.handle(), &output, real.handle(), &err);
+    EXPECT_NEAR(real[0], 1.0, 1e-15);
+    EXPECT_NEAR(real[1], 3.0, 1e-15);
+    EXPECT_EQ(symmetric.values(), (std::vector<double>{2.0, 9.0, 1.0, 2.0}));
+}
+
+template <class Elements, class Export>
+void ExpectSchur(const Elements &elements, int n, int32_t order, Export schur) {
+    auto t = Matrix(n, n, elements);
+    decltype(t) u;
+    CDBArray w;
+    ASSERT_EQ(schur(t.handle(), 1, order, u.handle(), w.handle()), 0);
+    const Exact U = Contents(u), T = Contents(t), A(n, n, elements.data());
+    EXPECT_LT(Deviation(U * T * U.adjoint(), A), 20.0);
+    EXPECT_LT(FromUnitary(U), 20.0);
+    const bool isComplex = std::is_same_v<Elements, std::vector<CDB>>;
+    EXPECT_EQ(T.below(isComplex ? 0 : -1), 0.0);
+    for (int i = 0; i < n; ++i) {
+        if (isComplex) {
+            EXPECT_EQ(std::complex<long double>(w[i].re, w[i].im), T(i, i));
+        } else if (i + 1 < n && T(i + 1, i) == 0.0L) {
+            EXPECT_EQ(w[i].re, T(i, i).real());
+        }
+    }
+    for (int i = 0; order != 0 && i + 1 < n; ++i) {
+        const double a = order < 3 ? w[i].re : std::hypot(w[i].re, w[i].im);
+        const double b = order < 3 ? w[i + 1].re : std::hypot(w[i + 1].re, w[i + 1].im);
+        const double rounding = 1e-9 * (1.0 + std::abs(a));
+        EXPECT_TRUE(order % 2 == 1 ? a <= b + rounding : a >= b - rounding) << i;
+    }
+}
+TEST(Schur, GivesTheMatrixBackWithItsEigenvaluesInOrder) {
+    for (const int n : {1, 2, 6, 25})
+        for (const int32_t order : {0, 1, 2, 3, 4}) {
+            SCOPED_TRACE(testing::Message() << "order " << order << ", n " << n);
+            ExpectSchur(RealMatrix(MatrixKinds()[0], n, n), n, order, Schur80_head);
+            ExpectSchur(ComplexMatrix(MatrixKinds()[0], n, n), n, order, CxSchur80_head);
         }
 }
 

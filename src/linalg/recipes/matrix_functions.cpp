@@ -1,0 +1,67 @@
+#include "qx/matrix_functions.h"
+#include "linalg/recipes/contents.h"
+#include "tests/support/recipe.h"
+
+namespace qx::test {
+
+namespace {
+
+constexpr auto DBL = ElementType::DBL;
+constexpr auto CDB = ElementType::CDB;
+
+const std::vector<int32_t> sizes = {1, 2, 3, 7, 20};
+
+template <ElementType Code, class Export>
+Recipe InPlace(const char *name, Export function) {
+    return {name,
+            [function](Call &c) {
+                return function(c.inOut2D<Code>(0, c.n, c.n, PositiveDefinite{c.n}), c.err());
+            },
+            BitsMayDiffer, sizes};
+}
+template <ElementType Code, class Export>
+Recipe Power(std::string name, int32_t power, Export function) {
+    return {name + ": power " + std::to_string(power),
+            [=](Call &c) { return function(c.inOut2D<Code>(0, c.n, c.n), power); }, BitsMayDiffer,
+            sizes};
+}
+template <ElementType Code, class Export>
+Recipe PseudoInverse(const char *name, Export function) {
+    return {name,
+            [function](Call &c) {
+                return function(c.inOut2D<Code>(0, c.n, c.n + 2), c.byReference(-1.0), c.err());
+            },
+            BitsMayDiffer, sizes};
+}
+
+std::vector<Recipe> FunctionRecipes() {
+    std::vector<Recipe> recipes = {
+        InPlace<DBL>("MatrixExp_head", MatrixExp_head),
+        InPlace<CDB>("CxMatrixExp_head", CxMatrixExp_head),
+        {"MatrixLn_head",
+         [](Call &c) {
+             return MatrixLn_head(c.in2D<DBL>(0, c.n, c.n, PositiveDefinite{c.n}), c.out2D<CDB>(0),
+                                  c.err());
+         },
+         BitsMayDiffer, sizes},
+        InPlace<CDB>("CxMatrixLn_head", CxMatrixLn_head),
+        InPlace<DBL>("MatrixSqrt_head", MatrixSqrt_head),
+        {"MatrixSqrtH",
+         [](Call &c) { return MatrixSqrtH(c.in2D<DBL>(0, c.n, c.n), c.out2D<CDB>(0)); },
+         BitsMayDiffer, sizes},
+        InPlace<CDB>("CxMatrixSqrt_head", CxMatrixSqrt_head),
+        PseudoInverse<DBL>("PseudoInverse_head", PseudoInverse_head),
+        PseudoInverse<CDB>("CxPseudoInverse_head", CxPseudoInverse_head),
+    };
+    for (const int32_t power : {-2, 0, 5}) {
+        recipes.push_back(Power<DBL>("MatrixPower_head", power, MatrixPower_head));
+        recipes.push_back(Power<CDB>("CxMatrixPower_head", power, CxMatrixPower_head));
+    }
+    return recipes;
+}
+
+const RecipeFile file(FunctionRecipes);
+
+} // namespace
+
+} // namespace qx::test

@@ -1,0 +1,220 @@
+#include "linalg/functions/functions.h"
+#include "linalg/tests/exact.h"
+#include "linalg/tests/host_matrix.h"
+#include "linalg/tests/matrices.h"
+#include "qx/qx.h"
+#include "tests/support/test_data.h"
+
+#include <gtest/gtest.h>
+
+#include <cstdlib>
+#include <fstream>
+#include <limits>
+#include <string>
+#include <vector>
+
+namespace {
+
+using namespace qx::test;
+
+struct Case {
+    std::string name;
+    int n;
+    std::vector<CDB> a, exp, log, root;
+    bool isReal() const {
+        for (const CDB &x : a)
+            if (x.im != 0.0)
+                return false;
+        return true;
+    }
+    std::vector<double> real() const {
+        std::vector<double> result;
+        for (const CDB &x : a)
+            result.push_back(x.re);
+        return result;
+    }
+};
+
+std::vector<Case> ReadCases() {
+    std::ifstream file(TestData("matrix_functions.dat"));
+    std::vector<Case> cases;
+    Case next;
+    while (file >> next.name >> next.n) {
+        for (std::vector<CDB> *matrix : {&next.a, &next.exp, &next.log, &next.root}) {
+            matrix->clear();
+            std::string re, im;
+            for (int i = 0; i < next.n * next.n && file >> re >> im; ++i)
+                matrix->push_back(
+                    {std::strtod(re.c_str(), nullptr), std::strtod(im.c_str(), nullptr)});
+        }
+        cases.push_back(next);
+    }
+    return cases;
+}
+
+// |a - b| / |b|
+template <class Array>
+double RelativeError(const Array &a, int n, const std::vector<CDB> &b) {
+    const Exact expected(n, n, b.data());
+    return static_cast<double>((Contents(a) - expected).norm() / expected.norm());
+}
+
+TEST(MatrixFunctions, AgreeWithSixtyDigits) {
+    const std::vector<Case> cases = ReadCases();
+    ASSERT_GE(cases.size(), 10U);
+    for (const Case &c : cases) {
+        SCOPED_TRACE(c.name);
+        ErrorCode err;
+        CDB2DArray exp(c.n, c.n, c.a), log(c.n, c.n, c.a), root(c.n, c.n, c.a);
+        CxMatrixExp_head(exp.handle(), &err);
+        EXPECT_EQ(err, 0);
+        EXPECT_LT(RelativeError(exp, c.n, c.exp), 2e-9);
+        CxMatrixLn_head(log.handle(), &err);
+        EXPECT_GE(err, 0);
+        EXPECT_LT(RelativeError(log, c.n, c.log), 1e-8);
+        const bool isRefined = err == 0;
+        CxMatrixExp_head(log.handle(), &err);
+        EXPECT_LT(RelativeError(log, c.n, c.a), isRefined ? 1e-11 : 1e-9);
+        CxMatrixSqrt_head(root.handle(), &err);
+        EXPECT_EQ(err, 0);
+        EXPECT_LT(RelativeError(root, c.n, c.root), 1e-14);
+        if (!c.isReal())
+            continue;
+        DBL2DArray a(c.n, c.n, c.real()), realExp = a, realRoot = a;
+        MatrixExp_head(realExp.handle(), &err);
+        EXPECT_LT(RelativeError(realExp, c.n, c.exp), 2e-9);
+        MatrixLn_head(a.handle(), log.handle(), &err);
+        EXPECT_LT(RelativeError(log, c.n, c.log), 1e-8);
+        EXPECT_EQ(MatrixSqrtH(a.handle(), root.handle()), 0);
+        EXPECT_LT(RelativeError(root, c.n, c.root), 1e-14);
+        MatrixSqrt_head(realRoot.handle(), &err);
+        EXPECT_EQ(err, 0);
+        for (int i = 0; i < c.n * c.n; ++i)
+            EXPECT_EQ(realRoot[i], root[i].re);
+    }
+}
+
+TEST(MatrixExponential, TakesADiagonalElementByElement) {
+    ErrorCode err;
+    const DBL2DArray a(2, 2, {1.0, 0.0, 0.0, -2.0}), zero(3, 3);
+    MatrixExp_head(a.handle(), &err);
+    EXPECT_EQ(a.values(), (std::vector<double>{std::exp(1.0), 0.0, 0.0, std::exp(-2.0)}));
+    MatrixExp_head(zero.handle(), &err);
+    EXPECT_EQ(zero.values(), (std::vector<double>{1, 0, 0, 0, 1, 0, 0, 0, 1}));
+    const CDB2DArray z(1, 1, {{0.0, 3.0}});
+    CxMatrixExp_head(z.handle(), &err);
+    EXPECT_NEAR(z[0].re, std::cos(3.0), 1e-16);
+    EXPECT_NEAR(z[0].im, std::sin(3.0), 1e-16);
+}
+TEST(MatrixExponential, ChoosesTheDegreeByItsBound) {
+    // The bound of each degree, from its definition with factorials.
+    const auto bound = [](int q) {
+        const long double e = std::exp2(3.0L - 2 * q) * std::tgamma(q + 1.0L) *
+                              std::tgamma(q + 1.0L) /
+                              (std::tgamma(2 * q + 1.0L) * std::tgamma(2 * q + 2.0L));
+        return e * std::exp(e);
+    };
+    for (const double norm : {0.01, 0.5, 1.0, 3.0, 20.0, 200.0}) {
+        const int q = qx::PadeDegree(1e-8, norm);
+        const long double target = 1e-8L / (std::exp(static_cast<long double>(norm)) * norm);
+        EXPECT_LE(bound(q), target * (1 + 1e-12L)) << norm;
+        if (q > 1) {
+            EXPECT_GT(bound(q - 1), target * (1 - 1e-12L)) << norm;
+        }
+    }
+    EXPECT_LT(qx::PadeDegree(1e-8, 1e300), 200);
+}
+
+TEST(MatrixLogarithm, OfSingularAndDefectiveMatrices) {
+    ErrorCode err;
+    const CDB2DArray nilpotent(2, 2, {{0, 0}, {1, 0}, {0, 0}, {0, 0}});
+    CxMatrixLn_head(nilpotent.handle(), &err);
+    EXPECT_EQ(err, ErrDegenerateValue);
+    EXPECT_EQ(nilpotent.rows(), 0);
+    const CDB2DArray zero(1, 1, {{0, 0}});
+    CxMatrixLn_head(zero.handle(), &err);
+    EXPECT_EQ(err, ErrDegenerateValue);
+    // log of (1 1; 0 1) is (0 1; 0 0).
+    CDB2DArray jordan(2, 2, {{1, 0}, {1, 0}, {0, 0}, {1, 0}}), again = jordan;
+    CxMatrixLn_head(jordan.handle(), &err);
+    EXPECT_GE(err, 0);
+    const std::vector<CDB> expected = {{0, 0}, {1, 0}, {0, 0}, {0, 0}};
+    EXPECT_LT(RelativeError(jordan, 2, expected), 1e-9);
+    CxMatrixLn_head(again.handle(), &err);
+    for (int i = 0; i < 4; ++i)
+        EXPECT_EQ(again[i].re, jordan[i].re);
+}
+
+TEST(MatrixSquareRoot, OfNegativeAndVanishingEigenvalues) {
+    ErrorCode err;
+    const DBL2DArray a(2, 2, {-4.0, 0.0, 0.0, 9.0});
+    CDB2DArray root;
+    EXPECT_EQ(MatrixSqrtH(a.handle(), root.handle()), 0);
+    EXPECT_NEAR(root[0].im, 2.0, 1e-15);
+    MatrixSqrt_head(a.handle(), &err);
+    EXPECT_EQ(err, 0);
+    EXPECT_NEAR(a[0], 0.0, 1e-15);
+    EXPECT_NEAR(a[3], 3.0, 1e-15);
+    EXPECT_EQ(MatrixSqrtH(DBL2DArray(3, 3).handle(), root.handle()), WarnLowAccuracy);
+    EXPECT_EQ(root.rows(), 3);
+    EXPECT_EQ(MatrixSqrtH(DBL2DArray(0, 2).handle(), root.handle()), ErrNotSquare);
+    EXPECT_EQ(MatrixSqrtH(DBL2DArray(0, 0).handle(), root.handle()), ErrEmptyInput);
+}
+
+TEST(MatrixPower, IsRepeatedMultiplication) {
+    for (const int n : {1, 3, 12}) {
+        const std::vector<double> elements = RealMatrix(MatrixKinds()[0], n, n);
+        Exact expected = Exact::Identity(n);
+        for (int power = 0; power <= 13; ++power) {
+            const DBL2DArray a(n, n, elements);
+            ASSERT_EQ(MatrixPower_head(a.handle(), power), 0);
+            EXPECT_LT(Deviation(Contents(a), expected), 4.0 * (power + 1)) << power;
+            expected = expected * Exact(n, n, elements.data());
+        }
+    }
+}
+TEST(MatrixPower, OfANegativeExponentIsOneOfThePseudoInverse) {
+    const DBL2DArray singular(2, 2, {2.0, 2.0, 2.0, 2.0}), extreme(1, 1, {1.0});
+    EXPECT_EQ(MatrixPower_head(singular.handle(), -2), 0);
+    for (int i = 0; i < 4; ++i)
+        EXPECT_NEAR(singular[i], 0.03125, 1e-16);
+    EXPECT_EQ(MatrixPower_head(extreme.handle(), std::numeric_limits<int32_t>::min()), 0);
+    EXPECT_EQ(extreme[0], 1.0);
+}
+
+// The four conditions of Penrose.
+template <class Elements, class Export>
+void ExpectPseudoInverse(const Elements &elements, int m, int n, Export invert) {
+    auto a = Matrix(m, n, elements);
+    const double tolerance = -1.0;
+    ErrorCode err;
+    invert(a.handle(), &tolerance, &err);
+    ASSERT_EQ(err, 0);
+    ASSERT_EQ(a.rows(), n);
+    ASSERT_EQ(a.cols(), m);
+    const Exact A(m, n, elements.data()), X = Contents(a);
+    const long double unit = 0x1p-52L * std::max(m, n) * A.norm() * X.norm();
+    EXPECT_LT((A * X * A - A).norm(), 8 * unit * A.norm());
+    EXPECT_LT((X * A * X - X).norm(), 8 * unit * X.norm());
+    EXPECT_LT((A * X - (A * X).adjoint()).norm(), 8 * unit);
+    EXPECT_LT((X * A - (X * A).adjoint()).norm(), 8 * unit);
+}
+TEST(PseudoInverse, MeetsItsFourConditions) {
+    for (const auto &[m, n] : {std::pair{1, 1}, {4, 4}, {7, 3}, {3, 7}, {20, 12}})
+        for (const int kind : {0, 2, 4, 10}) { // random, of rank 1, of rank 2, Frank
+            SCOPED_TRACE(testing::Message() << m << " by " << n << ' ' << MatrixKinds()[kind].name);
+            ExpectPseudoInverse(RealMatrix(MatrixKinds()[kind], m, n), m, n, PseudoInverse_head);
+            ExpectPseudoInverse(ComplexMatrix(MatrixKinds()[kind], m, n), m, n,
+                                CxPseudoInverse_head);
+        }
+}
+TEST(PseudoInverse, CutsAtAnAbsoluteTolerance) {
+    ErrorCode err;
+    for (const auto &[tolerance, expected] : {std::pair{0.0, 1e14}, {1e-14, 0.0}, {-1.0, 1e14}}) {
+        const DBL2DArray a(2, 2, {1.0, 0.0, 0.0, 1e-14});
+        PseudoInverse_head(a.handle(), &tolerance, &err);
+        EXPECT_DOUBLE_EQ(a[3], expected);
+    }
+}
+
+} // namespace
