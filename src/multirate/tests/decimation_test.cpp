@@ -60,8 +60,8 @@ TEST(Decimation, OfABlockPicksOrAverages) {
             average ? std::vector<double>{2, 5, 8} : std::vector<double>{1, 4, 7};
         EXPECT_EQ(x.values(), expected);
         ASSERT_EQ(z.size(), 3);
-        EXPECT_EQ(z.data()[2].re, expected[2]);
-        EXPECT_EQ(z.data()[2].im, -2 * expected[2]);
+        EXPECT_EQ(+z.data()[2].re, expected[2]);
+        EXPECT_EQ(+z.data()[2].im, -2 * expected[2]);
     }
     for (const int32_t factor : {-1, 0, 4}) {
         Array1D<DBL> x(3);
@@ -107,7 +107,7 @@ TEST(Decimation, OfAStreamIsThatOfOneBlockAfterTheStart) {
                                                      &zPartialCount, &zPartialSum),
                               0);
                     for (int32_t i = 0; i < z.size(); ++i)
-                        imaginary.push_back(z.data()[i].im);
+                        imaginary.push_back(+z.data()[i].im);
                     reset = 0;
                     return b.values();
                 });
@@ -393,8 +393,8 @@ TEST(Decimation, GroupsOfAStreamAreSummed) {
                                EXPECT_EQ(b.size(), static_cast<int32_t>(block.size()));
                                EXPECT_EQ(zOutCount, outCount);
                                for (int32_t i = 0; i < zOutCount; ++i) {
-                                   EXPECT_EQ(z.data()[i].re, factor);
-                                   imaginary.push_back(z.data()[i].im);
+                                   EXPECT_EQ(+z.data()[i].re, factor);
+                                   imaginary.push_back(+z.data()[i].im);
                                }
                                return std::vector<double>(b.data(), b.data() + outCount);
                            }),
@@ -444,7 +444,7 @@ TEST(Decimation, CascadedMovingSumsSizeTheirOwnState) {
                                              0);
                                    EXPECT_EQ(zPosition, position);
                                    for (int32_t i = 0; i < z.size(); ++i)
-                                       imaginary.push_back(z.data()[i].im);
+                                       imaginary.push_back(+z.data()[i].im);
                                    return b.values();
                                }),
                       Reals(sums));

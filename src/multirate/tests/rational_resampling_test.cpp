@@ -160,8 +160,8 @@ TEST(RationalResampling, ChannelsAreStreamsThatShareTheirPositions) {
             const Signal expected = alone[c].resample(rows[c]);
             ASSERT_EQ(y.cols(), static_cast<int32_t>(expected.size()));
             for (int32_t m = 0; m < y.cols(); ++m) {
-                EXPECT_EQ(y.at(c, m).re, expected[static_cast<std::size_t>(m)].real());
-                EXPECT_EQ(y.at(c, m).im, expected[static_cast<std::size_t>(m)].imag());
+                EXPECT_EQ(+y.at(c, m).re, expected[static_cast<std::size_t>(m)].real());
+                EXPECT_EQ(+y.at(c, m).im, expected[static_cast<std::size_t>(m)].imag());
             }
         }
     }

@@ -249,7 +249,7 @@ TEST(Resampling, OutputsAtAListOfTimesAreTheDefinition) {
             // The first time that is beyond the data ends the run and stands rebased.
             const double gap = antiAlias ? times[served] - previous : 1;
             EXPECT_FALSE(kernel.isServed(times[served], gap, 300));
-            EXPECT_EQ(t.data()[served].re, times[served] - consumed);
+            EXPECT_EQ(+t.data()[served].re, times[served] - consumed);
             EXPECT_EQ(lastTime, previous - consumed);
             const long double step = kernel.step(gap);
             EXPECT_EQ(consumed,

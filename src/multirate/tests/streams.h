@@ -38,9 +38,9 @@ Signal Get(const Array1D<Code> &array) {
     Signal signal;
     for (int32_t i = 0; i < array.size(); ++i)
         if constexpr (isComplex<Code>)
-            signal.emplace_back(array.data()[i].re, array.data()[i].im);
+            signal.emplace_back(+array.data()[i].re, +array.data()[i].im);
         else
-            signal.emplace_back(array.data()[i]);
+            signal.emplace_back(+array.data()[i]);
     return signal;
 }
 
