@@ -48,7 +48,29 @@ def wave_cases(n):
     ]
 
 
-GROUPS = [("noise, called from Python", noise_cases), ("waves, called from Python", wave_cases)]
+def array_cases(n):
+    x = np.random.default_rng(2).normal(size=n)
+    phase = np.angle(np.exp(1j * 0.7 * np.arange(n)))
+    matrix = x.reshape(-1, 10)
+
+    def standardised():
+        return (x - x.mean()) / x.std()
+
+    def scaled():
+        low, high = x.min(), x.max()
+        return (x - (high + low) / 2) / ((high - low) / 2)
+
+    return [
+        ("scale", lambda: qx.call("Scale1DCIN", x), scaled),
+        ("quick scale", lambda: qx.call("QScale", matrix), lambda: matrix / np.abs(matrix).max()),
+        ("standardise", lambda: qx.call("Norm1", x), standardised),
+        ("line", lambda: qx.call("Line1", x, 2.0, 1.0), lambda: 2.0 * x + 1.0),
+        ("unwrap", lambda: qx.call("unWrap85", phase, 0), lambda: np.unwrap(phase)),
+    ]
+
+
+GROUPS = [("noise, called from Python", noise_cases), ("waves, called from Python", wave_cases),
+          ("scaling and unwrapping, called from Python", array_cases)]
 
 
 def seconds(function, repeats):

@@ -120,6 +120,12 @@ void *QXHostCopy2D(int32_t typeCode, int32_t rows, int32_t cols, const void *ele
     return New2D(ElementSize(typeCode), rows, cols, elements);
 }
 
+void *QXHostCopy3D(int32_t typeCode, int32_t first, int32_t second, int32_t third,
+                   const void *elements) {
+    const int32_t sizes[3] = {first, second, third};
+    return NewArray(3, ElementSize(typeCode), sizes, elements);
+}
+
 void *QXHostCopyRecords(int32_t recordSize, int32_t count, const void *records) {
     return New1D(recordSize > 0 ? static_cast<std::size_t>(recordSize) : 0, count, records);
 }

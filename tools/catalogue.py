@@ -33,12 +33,12 @@ NOT_A_FAMILY = {"types.h", "errors.h", "host.h", "qx.h"}
 SCALARS = {
     "int32_t": "I32", "I32": "I32", "ErrorCode": "I32", "uint8_t": "U8", "U8": "U8",
     "int16_t": "I16",
-    "uint32_t": "U32", "U32": "U32", "float": "SGL", "SGL": "SGL", "double": "DBL", "DBL": "DBL",
+    "uint16_t": "U16", "uint32_t": "U32", "U32": "U32", "float": "SGL", "SGL": "SGL", "double": "DBL", "DBL": "DBL",
     "CSG": "CSG", "CDB": "CDB",
 }
 DIRECTIONS = {"QX_IN": "in", "QX_OUT": "out", "QX_INOUT": "inout"}
-HANDLE_DIMENSIONS = {"QX_ARRAY_1D": 1, "QX_ARRAY_2D": 2}
-UNTYPED_HANDLES = {"Array1DHandle", "Array2DHandle"}
+HANDLE_DIMENSIONS = {"QX_ARRAY_1D": 1, "QX_ARRAY_2D": 2, "QX_ARRAY_3D": 3}
+UNTYPED_HANDLES = {"Array1DHandle", "Array2DHandle", "Array3DHandle"}
 
 TOKEN = re.compile(
     r"(?P<comment>/\*.*?\*/|//[^\n]*)|(?P<directive>^[ \t]*\#(?:\\\n|[^\n])*)"

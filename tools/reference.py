@@ -37,7 +37,7 @@ figure { margin: .6em 0; } figure svg { width: 100%; height: auto; }
 .as { border-left: 3px solid #d5dbe3; padding-left: .9em; }
 ul.index { columns: 3; padding-left: 1.2em; font-size: .92em; }
 """
-KINDS = {"array1d": "array of {}", "array2d": "matrix of {}", "value": "{}",
+KINDS = {"array1d": "array of {}", "array2d": "matrix of {}", "array3d": "array of {}, three dimensions", "value": "{}",
          "reference": "{} by reference", "output": "{}", "inout": "{}", "error": "code",
          "record": "record {}", "slot": "plan slot", "instance": "instance data",
          "opaque": "pointer", "buffer": "pointer to {}", "procedure": "procedure"}

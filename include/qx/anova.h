@@ -23,7 +23,8 @@ QX_API int32_t Contingency_head(QX_IN I32_2D table, QX_OUT DBL *chiSquare, QX_OU
     costs digits.
     Codes: ErrSizeMismatch (the lengths differ), ErrEmptyInput (y is empty), ErrAnovaFewLevels (k is
     below 2 or not below the number of observations), ErrOutOfMemory (no scratch memory),
-    ErrAnovaFactorEmpty (more labels than k), ErrAnovaNoReplication (fewer). */
+    ErrAnovaFactorEmpty (more labels than k), ErrAnovaNoReplication (fewer),
+    ErrNaNInData (f is NaN). */
 QX_API int32_t Anova1Way_head(QX_IN DBL1D y, QX_IN I32_1D labels, QX_IN const int32_t *k,
                               QX_OUT DBL *ssBetween, QX_OUT DBL *msBetween, QX_OUT DBL *f,
                               QX_OUT DBL *p, QX_OUT DBL *ssError, QX_OUT DBL *msError,
@@ -34,7 +35,7 @@ QX_API int32_t Anova1Way_head(QX_IN DBL1D y, QX_IN I32_1D labels, QX_IN const in
     Codes: ErrSizeMismatch (the lengths differ), ErrEmptyInput (y is empty), ErrAnovaFewLevels (k is
     below 2 or not below the number of observations), ErrBadSignificance (alpha lies outside [0,
     1]), ErrOutOfMemory (no scratch memory), ErrAnovaFactorEmpty (more labels than k),
-    ErrAnovaNoReplication (fewer). */
+    ErrAnovaNoReplication (fewer), ErrNaNInData (f is NaN). */
 QX_API int32_t Anova1Way_head_2017(QX_IN DBL1D y, QX_IN I32_1D labels, QX_IN const int32_t *k,
                                    double alpha, QX_OUT DBL *ssBetween, QX_OUT DBL *msBetween,
                                    QX_OUT DBL *f, QX_OUT DBL *p, QX_OUT DBL *ssError,

@@ -41,6 +41,9 @@ QX_HOST_API void *QXHostNew2D(int32_t typeCode, int32_t rows, int32_t cols);
 QX_HOST_API void *QXHostCopy1D(int32_t typeCode, int32_t count, const void *elements);
 QX_HOST_API void *QXHostCopy2D(int32_t typeCode, int32_t rows, int32_t cols,
                                        const void *elements);
+/* In three dimensions, for inputs; such an array cannot be resized. */
+QX_HOST_API void *QXHostCopy3D(int32_t typeCode, int32_t first, int32_t second, int32_t third,
+                               const void *elements);
 /* Records of the caller's, for the exports that take an array of them. Such an array cannot be
    resized. */
 QX_HOST_API void *QXHostCopyRecords(int32_t recordSize, int32_t count, const void *records);

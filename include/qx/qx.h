@@ -4,6 +4,7 @@
 /* Every export of the module. */
 
 #include "qx/anova.h"
+#include "qx/calculus.h"
 #include "qx/chirp_z.h"
 #include "qx/convolution.h"
 #include "qx/convolution_2d.h"
@@ -19,10 +20,13 @@
 #include "qx/matrix_functions.h"
 #include "qx/matrix_products.h"
 #include "qx/matrix_properties.h"
+#include "qx/interpolation.h"
 #include "qx/noise.h"
 #include "qx/polyphase.h"
 #include "qx/rational_resampling.h"
 #include "qx/resampling.h"
+#include "qx/scaling.h"
+#include "qx/shuffling.h"
 #include "qx/special.h"
 #include "qx/special_matrices.h"
 #include "qx/spectra.h"

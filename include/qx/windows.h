@@ -77,7 +77,7 @@ QX_API ErrorCode CxExpWinH(QX_INOUT CDB1D x, double finalValue);
 /** Cosine tapered window: sin^2 tapers over `taperRatio` of the samples, half at each end, in
     symmetric form. A ratio of 1 or more gives the Hanning window, in periodic form; one of 0 or
     less leaves x as it is.
-    Codes: ErrEmptyInput (x is empty). */
+    Codes: ErrEmptyInput (x is empty), ErrOutOfMemory (no scratch memory for the Hanning window). */
 QX_API ErrorCode CosTaperedH(QX_INOUT DBL1D x, double taperRatio);
 /** As CosTaperedH, for complex samples. */
 QX_API ErrorCode CxCosTaperedH(QX_INOUT CDB1D x, double taperRatio);

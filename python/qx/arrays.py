@@ -106,7 +106,7 @@ def filled(value, element, dimensions, name, reuse):
         return Block(host.QXHostCopyRecords(dtype.itemsize, array.size, array.ctypes.data), dtype, 1)
     direct = array.dtype == dtype and array.flags.c_contiguous
     source = array.__array_interface__["data"][0] if direct and array.size else None
-    copy = host.QXHostCopy1D if dimensions == 1 else host.QXHostCopy2D
+    copy = (host.QXHostCopy1D, host.QXHostCopy2D, host.QXHostCopy3D)[dimensions - 1]
     block = Block(copy(TYPE_CODES[element], *array.shape, source), dtype, dimensions)
     if not direct:
         block.view()[...] = array

@@ -41,6 +41,7 @@ class Library:
                 ("QXHostNew2D", pointer, [int32, int32, int32]),
                 ("QXHostCopy1D", pointer, [int32, int32, pointer]),
                 ("QXHostCopy2D", pointer, [int32, int32, int32, pointer]),
+                ("QXHostCopy3D", pointer, [int32, int32, int32, int32, pointer]),
                 ("QXHostCopyRecords", pointer, [int32, int32, pointer]),
                 ("QXHostFree", None, [pointer]),
                 ("QXHostReleaseObject", int32, [pointer]),

@@ -55,6 +55,8 @@ template <ElementType Code>
 int32_t AverageStream(typename Element<Code>::type *x, int32_t n, int32_t factor, int32_t *start,
                       int32_t *partialCount, typename Element<Code>::type *partialSum) {
     typedef typename Element<Code>::type T;
+    if (n < 1) // nothing comes and nothing can go, whatever the caller holds as the part's count
+        return 0;
     int32_t outputs = 0;
     int32_t used = std::min(*start, n);
     if (*partialCount > 0) {
@@ -69,7 +71,8 @@ int32_t AverageStream(typename Element<Code>::type *x, int32_t n, int32_t factor
         *start -= n;
         return 0;
     }
-    for (; n - used >= factor; used += factor)
+    // The bound holds by itself unless the caller's count does not fit its start.
+    for (; n - used >= factor && outputs < n; used += factor)
         x[outputs++] = Divided<Code>(Summed<Code>(T{}, x + used, factor), factor);
     *partialCount = n - used;
     *partialSum = Summed<Code>(T{}, x + used, *partialCount);

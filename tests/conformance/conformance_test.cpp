@@ -1,4 +1,5 @@
 #include "qx/frame.h"
+#include "tests/support/code_list.h"
 #include "tests/support/heap_probe.h"
 #include "tests/support/recipe.h"
 
@@ -7,9 +8,7 @@
 #include <algorithm>
 #include <cctype>
 #include <fstream>
-#include <map>
 #include <set>
-#include <sstream>
 #include <string>
 #include <thread>
 
@@ -26,33 +25,6 @@ struct Result {
     uint64_t hash;
     int32_t reshapes;
 };
-
-// What the headers say of an export's codes.
-struct Documented {
-    bool hostStatus = false;
-    std::set<ErrorCode> codes = {0};
-};
-
-// By name; exports without a status are not among them.
-const std::map<std::string, Documented> &DocumentedCodes() {
-    static const auto all = [] {
-        std::map<std::string, Documented> exports;
-        std::ifstream file(QX_CODE_LIST);
-        for (std::string line; std::getline(file, line);) {
-            std::istringstream words(line);
-            std::string word;
-            words >> word;
-            Documented &documented = exports[word];
-            while (words >> word)
-                if (word == "host")
-                    documented.hostStatus = true;
-                else
-                    documented.codes.insert(std::stoi(word));
-        }
-        return exports;
-    }();
-    return all;
-}
 
 class Conformance : public testing::TestWithParam<Recipe> {
 protected:
@@ -76,8 +48,9 @@ protected:
         return status;
     }
     static void expectDocumented(ErrorCode status, int32_t refusal) {
-        const auto found = DocumentedCodes().find(GetParam().exportName());
-        if (found == DocumentedCodes().end())
+        static const auto all = ReadCodeList(QX_CODE_LIST);
+        const auto found = all.find(GetParam().exportName());
+        if (found == all.end())
             EXPECT_EQ(status, 0) << "of an export that has none by its declaration";
         else if (refusal != 0 && status == refusal)
             EXPECT_TRUE(found->second.hostStatus) << "the host's status is not under Codes:";

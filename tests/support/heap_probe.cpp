@@ -19,6 +19,7 @@ namespace {
 struct Watch {
     bool on;
     int32_t failAt;
+    std::size_t largest;
     int32_t allocations;
     int32_t live;
 };
@@ -27,7 +28,7 @@ __attribute__((tls_model("initial-exec"))) thread_local Watch watch;
 
 } // namespace
 
-HeapProbe::HeapProbe(int32_t failAt) { watch = {true, failAt, 0, 0}; }
+HeapProbe::HeapProbe(int32_t failAt, std::size_t largest) { watch = {true, failAt, largest, 0, 0}; }
 HeapProbe::~HeapProbe() { watch.on = false; }
 int32_t HeapProbe::allocations() const { return watch.allocations; }
 int32_t HeapProbe::liveAllocations() const { return watch.live; }
@@ -40,10 +41,10 @@ bool HeapProbe::works() { return true; }
 
 namespace {
 
-bool Refuses() {
+bool Refuses(std::size_t size) {
     if (!watch.on)
         return false;
-    if (++watch.allocations == watch.failAt) {
+    if (++watch.allocations == watch.failAt || size > watch.largest) {
         errno = ENOMEM;
         return true;
     }
@@ -73,13 +74,14 @@ void *__libc_realloc(void *, std::size_t);
 void __libc_free(void *);
 
 __attribute__((visibility("default"))) void *malloc(std::size_t size) {
-    return qx::test::Refuses() ? nullptr : qx::test::Granted(__libc_malloc(size));
+    return qx::test::Refuses(size) ? nullptr : qx::test::Granted(__libc_malloc(size));
 }
 __attribute__((visibility("default"))) void *calloc(std::size_t count, std::size_t size) {
-    return qx::test::Refuses() ? nullptr : qx::test::Granted(__libc_calloc(count, size));
+    return qx::test::Refuses(count * size) ? nullptr
+                                           : qx::test::Granted(__libc_calloc(count, size));
 }
 __attribute__((visibility("default"))) void *realloc(void *block, std::size_t size) {
-    if (qx::test::Refuses())
+    if (qx::test::Refuses(size))
         return nullptr;
     void *grown = __libc_realloc(block, size);
     return block == nullptr ? qx::test::Granted(grown) : grown;

@@ -1,7 +1,9 @@
 #ifndef QX_TESTS_HEAP_PROBE_H
 #define QX_TESTS_HEAP_PROBE_H
 
+#include <cstddef>
 #include <cstdint>
+#include <limits>
 
 namespace qx::test {
 
@@ -11,8 +13,10 @@ class HeapProbe {
 public:
     static bool works();
 
-    // Watches from construction to destruction; the n-th allocation fails (0 for none).
-    explicit HeapProbe(int32_t failAt = 0);
+    // Watches from construction to destruction; the n-th allocation fails (0 for none), and so does
+    // each of more than `largest` bytes.
+    explicit HeapProbe(int32_t failAt = 0,
+                       std::size_t largest = std::numeric_limits<std::size_t>::max());
     ~HeapProbe();
     HeapProbe(const HeapProbe &) = delete;
     HeapProbe &operator=(const HeapProbe &) = delete;

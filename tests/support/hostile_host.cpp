@@ -17,7 +17,6 @@ namespace {
 
 constexpr std::size_t guardSize = 64;
 constexpr unsigned char guardByte = 0xFD;
-constexpr unsigned char freshByte = 0xA5; // as doubles about -1e-128, as int32 about -1.5e9
 constexpr unsigned char deadByte = 0xDE;
 constexpr std::size_t quarantineLimit = 64;
 
@@ -47,7 +46,7 @@ Block Allocate(std::size_t size, int32_t numDims) {
     if (memory == nullptr)
         throw std::bad_alloc();
     std::memset(memory, guardByte, guardSize);
-    std::memset(memory + guardSize, freshByte, size);
+    std::memset(memory + guardSize, Host().freshByte, size);
     std::memset(memory + guardSize + size, guardByte, guardSize);
     return {memory, size, numDims};
 }
@@ -93,10 +92,6 @@ std::size_t ElementSize(int32_t typeCode) {
     throw std::logic_error("a reshape with an unknown type code");
 }
 
-constexpr int32_t statusNoMemory = 2;
-// More than any test needs, so that absurd requests are refused and not granted lazily.
-constexpr uint64_t largestBlock = uint64_t{1} << 30;
-
 } // namespace
 
 HostRecord &Host() {
@@ -104,7 +99,12 @@ HostRecord &Host() {
     return record;
 }
 
-void ResetHost(int32_t failAt, int32_t failStatus) { Host() = {{}, failAt, failStatus}; }
+void ResetHost(int32_t failAt, int32_t failStatus) {
+    HostRecord fresh;
+    fresh.failAt = failAt;
+    fresh.failStatus = failStatus;
+    Host() = fresh;
+}
 
 void RunSweeps() {
     Registry &registry = Blocks();
@@ -173,6 +173,11 @@ void FreeBlock(void *handle) {
     delete static_cast<void **>(handle);
 }
 
+std::size_t BlockSize(void *handle) {
+    const std::lock_guard hold(Blocks().lock);
+    return Blocks().live.at(handle).size;
+}
+
 int32_t ReshapeBlock(int32_t typeCode, int32_t numDims, void *handleAddress, int32_t count) {
     const HeapProbe::Pause pause;
     HostRecord &record = Host();
@@ -191,7 +196,7 @@ int32_t ReshapeBlock(int32_t typeCode, int32_t numDims, void *handleAddress, int
         throw std::logic_error("a reshape to a negative count");
     const uint64_t size =
         4 * static_cast<uint64_t>(numDims) + static_cast<uint64_t>(count) * ElementSize(typeCode);
-    if (size > largestBlock)
+    if (size > record.largestBlock)
         return statusNoMemory;
 
     const Block old = found->second;

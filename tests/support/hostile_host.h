@@ -30,8 +30,15 @@ struct HostRecord {
     int32_t failAt = 0;            // the n-th reshape from the last reset fails; 0 for none
     int32_t failStatus = 0;        // with this status
     int32_t sweepStatus = 0;       // what a registration of a sweep gives; not 0 refuses it
+    // More is refused, with the status of a host that has no memory: by default more than any test
+    // needs, so that absurd requests are not granted lazily.
+    std::size_t largestBlock = std::size_t{1} << 30;
+    // What the bytes of a new block hold: as doubles about -1e-128, as int32 about -1.5e9.
+    unsigned char freshByte = 0xA5;
 };
 HostRecord &Host();
+constexpr int32_t everyReshape = -1; // as `failAt`
+constexpr int32_t statusNoMemory = 2;
 // Forgets the calling thread's record and sets which reshape fails.
 void ResetHost(int32_t failAt = 0, int32_t failStatus = 0);
 
@@ -93,6 +100,7 @@ using Handle2D = typename Handles<Code>::TwoD;
 namespace detail {
 void *NewBlock(int32_t numDims, std::size_t elementSize, int32_t rows, int32_t cols);
 void FreeBlock(void *handle);
+std::size_t BlockSize(void *handle); // sizes and elements
 int32_t ReshapeBlock(int32_t typeCode, int32_t numDims, void *handleAddress, int32_t count);
 int32_t RegisterSweep(int32_t (*procedure)(void *), void *argument, int32_t mode);
 } // namespace detail

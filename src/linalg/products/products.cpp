@@ -15,7 +15,7 @@ namespace qx {
 namespace {
 
 // Up to here the ordered product is as fast as BLAS.
-constexpr int64_t smallProduct = 8 * 8 * 8;
+constexpr int64_t smallProduct = 32 * 32 * 32;
 
 // Large products run in bands, so that a band of a and of the result stays in the caches.
 constexpr int32_t band = 1530;

@@ -11,9 +11,11 @@ namespace qx {
 
 namespace {
 
-// The factorisation runs in panels of columns. All terms of an element are subtracted in ascending
-// order whatever the panel's width: first those of the panels to its left, then those of its own.
-constexpr int32_t panelWidth = 32;
+// The factorisation halves the columns until they are few, so that nearly all terms are subtracted
+// in products of blocks (S. Toledo, "Locality of reference in LU decomposition with partial
+// pivoting", 1997). Those of one element are subtracted in ascending order all the same.
+constexpr int32_t fewColumns = 16;
+constexpr int32_t fewRows = 4;
 
 void SubtractTerms(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, const DBL *a, const DBL *b,
                    DBL *c, std::ptrdiff_t stride) {
@@ -35,18 +37,29 @@ public:
         const int32_t steps = m_ < n_ ? m_ : n_;
         for (int32_t k = 0; k < m_; ++k)
             pivots_[k] = k;
-        for (int32_t first = 0; first < steps; first += panelWidth) {
-            const int32_t end = first + panelWidth < steps ? first + panelWidth : steps;
-            for (int32_t k = first; k < end; ++k)
-                eliminate(k, end);
-            updateRight(first, end);
-        }
+        factorColumns(0, steps);
+        if (steps < n_)
+            updateRight(0, steps, n_);
         *parity = parity_;
         return status_;
     }
 
 private:
     T *row(int32_t i) const { return a_ + std::ptrdiff_t{i} * n_; }
+
+    // The columns from `first` to `end`, from which the terms of the columns left of them have been
+    // subtracted.
+    void factorColumns(int32_t first, int32_t end) {
+        if (end - first <= fewColumns) {
+            for (int32_t k = first; k < end; ++k)
+                eliminate(k, end);
+            return;
+        }
+        const int32_t middle = first + (end - first) / 2;
+        factorColumns(first, middle);
+        updateRight(first, middle, end);
+        factorColumns(middle, end);
+    }
 
     // Column k, whose terms have all been subtracted: pivot, division, and the terms of column k in
     // the columns right of it up to `end`.
@@ -88,16 +101,29 @@ private:
         parity_ ^= 1;
     }
 
-    // The columns right of a panel that is done: first its own rows, which need each other, then
-    // all rows below at once.
-    void updateRight(int32_t first, int32_t end) {
-        const int32_t cols = n_ - end;
-        if (cols == 0)
+    // Subtracts the terms of the columns from `first` to `middle`, which are done, from the columns
+    // up to `end`: first in their own rows, which need each other, then in all rows below.
+    void updateRight(int32_t first, int32_t middle, int32_t end) {
+        const int32_t cols = end - middle;
+        updateRows(first, middle, middle, cols);
+        SubtractTerms(m_ - middle, cols, middle - first, row(middle) + first, row(first) + middle,
+                      row(middle) + middle, n_);
+    }
+    void updateRows(int32_t first, int32_t end, int32_t col, int32_t cols) {
+        if (end - first <= fewRows) {
+            for (int32_t i = first + 1; i < end; ++i)
+                for (int32_t k = first; k < i; ++k) {
+                    const auto factor = row(i)[k];
+                    for (int32_t j = col; j < col + cols; ++j)
+                        row(i)[j] = row(i)[j] - factor * row(k)[j];
+                }
             return;
-        for (int32_t i = first + 1; i < end; ++i)
-            SubtractTerms(1, cols, i - first, row(i) + first, row(first) + end, row(i) + end, n_);
-        SubtractTerms(m_ - end, cols, end - first, row(end) + first, row(first) + end,
-                      row(end) + end, n_);
+        }
+        const int32_t middle = first + (end - first) / 2;
+        updateRows(first, middle, col, cols);
+        SubtractTerms(end - middle, cols, middle - first, row(middle) + first, row(first) + col,
+                      row(middle) + col, n_);
+        updateRows(middle, end, col, cols);
     }
 
     T *a_;

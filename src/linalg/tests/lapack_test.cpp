@@ -1,3 +1,4 @@
+#include "linalg/blas_memory.h"
 #include "linalg/lapack.h"
 #include "linalg/matrix.h"
 #include "linalg/products/products.h"
@@ -8,6 +9,7 @@
 #include <cmath>
 #include <complex>
 #include <limits>
+#include <memory>
 #include <thread>
 #include <vector>
 
@@ -115,6 +117,24 @@ TEST(Lapack, BandAndTridiagonalDriversSolve) {
         EXPECT_NEAR(x.re, 1.0, 1e-15);
         EXPECT_NEAR(x.im, 0.0, 1e-15);
     }
+}
+
+// Only as many may call at once as there are blocks; who comes late gets a code and may come again.
+TEST(Blas, RefusesCallersWithoutMemory) {
+    if (sizeof(void *) == 4)
+        GTEST_SKIP() << "the blocks, which are kept, would fill the address space";
+    const int n = 40;
+    const auto a = Reals(n * n, 1);
+    std::vector<double> c(n * n);
+    {
+        std::vector<std::unique_ptr<qx::BlasMemory>> callers;
+        do
+            callers.push_back(std::make_unique<qx::BlasMemory>());
+        while (*callers.back() && callers.size() < 5000);
+        ASSERT_LT(callers.size(), 5000U);
+        EXPECT_EQ(qx::MatrixProductPlain(a.data(), a.data(), n, n, n, c.data()), ErrOutOfMemory);
+    }
+    EXPECT_EQ(qx::MatrixProductPlain(a.data(), a.data(), n, n, n, c.data()), 0);
 }
 
 TEST(Blas, ThreadsAtOnceGetTheBitsOfOneAlone) {

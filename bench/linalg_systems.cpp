@@ -1,0 +1,170 @@
+// Products, LU solves and inverses against BLAS and LAPACK, both as the module carries them, so
+// that the same kernels stand behind either side. And what an export adds to its inner routine.
+//
+// bench_linalg_systems [GROUP...]: products, ordered, small, solve, inverse, frame; all by default.
+
+#include "bench/timing.h"
+#include "linalg/blas_memory.h"
+#include "linalg/products/products.h"
+#include "linalg/systems/lu.h"
+#include "qx/host.hpp"
+#include "qx/linear_systems.h"
+
+#define lapack_complex_float CSG
+#define lapack_complex_double CDB
+#include <cblas.h>
+#include <lapack.h>
+
+#include <algorithm>
+#include <cstdint>
+#include <cstring>
+#include <random>
+#include <string>
+#include <vector>
+
+namespace {
+
+using namespace qx::bench;
+
+std::vector<double> Random(std::size_t count) {
+    std::mt19937_64 random(count);
+    std::vector<double> x(count);
+    for (double &value : x)
+        value = static_cast<double>(random() >> 11) * 0x1p-53 - 0.5;
+    return x;
+}
+
+// Minima of interleaved runs: what else runs on the machine only ever adds.
+template <class Ours, class Peer>
+std::pair<double, double> Times(const Ours &ours, const Peer &peer) {
+    const std::size_t ourRepeats = RepeatsFor(1e-4, ours), peerRepeats = RepeatsFor(1e-4, peer);
+    std::pair<double, double> best(1e9, 1e9);
+    double taken = 0;
+    for (int round = 0; round < 40 && (round < 5 || taken < 2.0); ++round) {
+        const double first = SecondsOf(ourRepeats, ours), second = SecondsOf(peerRepeats, peer);
+        taken += first + second;
+        best.first = std::min(best.first, first / static_cast<double>(ourRepeats));
+        best.second = std::min(best.second, second / static_cast<double>(peerRepeats));
+    }
+    return best;
+}
+
+template <class Ours, class Peer>
+void Compare(Ratios &ratios, const char *name, int32_t n, const Ours &ours, const Peer &peer) {
+    const auto [our, their] = Times(ours, peer);
+    std::printf("%-18s n %5d %12.3f us  ratio %5.2f\n", name, n, our * 1e6, our / their);
+    std::fflush(stdout);
+    ratios.add(our / their, "n " + std::to_string(n));
+}
+
+void Products() {
+    Ratios ratios("matrix products of 64 and up");
+    for (const int32_t n : {64, 100, 200, 500, 1000}) {
+        const auto a = Random(static_cast<std::size_t>(n) * n);
+        std::vector<double> c(a.size());
+        Compare(
+            ratios, "product", n,
+            [&] { qx::MatrixProductPlain(a.data(), a.data(), n, n, n, c.data()); },
+            [&] {
+                cblas_dgemm(CblasRowMajor, CblasNoTrans, CblasNoTrans, n, n, n, 1.0, a.data(), n,
+                            a.data(), n, 0.0, c.data(), n);
+            });
+    }
+    ratios.summary("cblas_dgemm");
+}
+
+// The product that keeps the order of its sums, at every size.
+void Ordered() {
+    Ratios ratios("matrix products in a stated order");
+    for (const int32_t n : {2, 4, 8, 16, 32, 64, 200, 500}) {
+        const auto a = Random(static_cast<std::size_t>(n) * n);
+        std::vector<double> c(a.size());
+        Compare(
+            ratios, "ordered product", n,
+            [&] { qx::OrderedProduct(a.data(), a.data(), n, n, n, c.data()); },
+            [&] {
+                cblas_dgemm(CblasRowMajor, CblasNoTrans, CblasNoTrans, n, n, n, 1.0, a.data(), n,
+                            a.data(), n, 0.0, c.data(), n);
+            });
+    }
+    ratios.summary("cblas_dgemm");
+}
+
+void Solve(const char *name, std::initializer_list<int32_t> sizes) {
+    Ratios ratios(name);
+    for (const int32_t n : sizes) {
+        const auto a = Random(static_cast<std::size_t>(n) * n), b = Random(n);
+        std::vector<double> factors(a.size()), x(n), y(n);
+        std::vector<int32_t> pivots(n);
+        Compare(
+            ratios, "solve", n, [&] { qx::SolveByLU(a.data(), n, b.data(), x.data()); },
+            [&] {
+                const int32_t one = 1;
+                int32_t info;
+                factors = a;
+                y = b;
+                LAPACK_dgesv(&n, &one, factors.data(), &n, pivots.data(), y.data(), &n, &info);
+            });
+    }
+    ratios.summary("LAPACK dgesv");
+}
+
+void Inverse() {
+    Ratios ratios("inverses");
+    for (const int32_t n : {4, 8, 32, 100, 300}) {
+        const auto a = Random(static_cast<std::size_t>(n) * n);
+        std::vector<double> factors(a.size()), inverse(a.size()), other(a.size());
+        std::vector<int32_t> pivots(n);
+        Compare(
+            ratios, "inverse", n, [&] { qx::InvertByLU(a.data(), n, inverse.data()); },
+            [&] {
+                int32_t info;
+                factors = a;
+                std::fill(other.begin(), other.end(), 0.0);
+                for (int32_t i = 0; i < n; ++i)
+                    other[static_cast<std::size_t>(i) * (n + 1)] = 1.0;
+                LAPACK_dgesv(&n, &n, factors.data(), &n, pivots.data(), other.data(), &n, &info);
+            });
+    }
+    ratios.summary("LAPACK dgesv on the unit matrix");
+}
+
+void Frame() {
+    const qx::host::Array2D<double> a(1, 1);
+    const qx::host::Array1D<double> b({1.0}), x({1.0});
+    a.data()[0] = 2.0;
+    double y;
+    ErrorCode err;
+    const auto [call, inner] =
+        Times([&] { EqsByLUDri_head(a.handle(), b.handle(), x.handle(), &err); },
+              [&] {
+                  qx::SolveByLU(a.data(), 1, b.data(), &y);
+                  Keep(y);
+              });
+    std::printf("frame of EqsByLUDri_head: %.0f ns (the call %.0f ns)\n", (call - inner) * 1e9,
+                call * 1e9);
+}
+
+} // namespace
+
+int main(int argc, char **argv) {
+    const qx::BlasMemory memory;
+    const auto wanted = [&](const char *group) {
+        return argc < 2 || std::any_of(argv + 1, argv + argc, [&](const char *argument) {
+                   return std::strcmp(argument, group) == 0;
+               });
+    };
+    if (wanted("products"))
+        Products();
+    if (wanted("ordered"))
+        Ordered();
+    if (wanted("small"))
+        Solve("linear systems up to 8 by 8", {1, 2, 3, 4, 5, 6, 7, 8});
+    if (wanted("solve"))
+        Solve("linear systems of 16 to 2000", {16, 32, 64, 100, 200, 300, 500, 1000, 2000});
+    if (wanted("inverse"))
+        Inverse();
+    if (wanted("frame"))
+        Frame();
+    return memory ? 0 : 1;
+}

@@ -1,0 +1,121 @@
+#ifndef QX_CALCULUS_H
+#define QX_CALCULUS_H
+
+/* Integrals and derivatives of samples at a constant step dt.
+
+   Definite integrals become one number, by composite Newton-Cotes rules:
+
+       0 trapezoid, 1 Simpson, 2 Simpson 3/8, 3 Bode (Boole), which take 2, 3, 4, 5 samples a panel,
+       4 left and 5 right rectangles (only where said)
+
+   Running integrals and derivatives become an array of the samples' length, in place. Those that
+   look beyond the ends of the data take the samples there from `initial` and `final`: x[-1] is the
+   last of `initial`, x[n] the first of `final`. M. Abramowitz and I. A. Stegun, "Handbook of
+   mathematical functions", 1964, chapter 25, has the rules. */
+
+#include "qx/types.h"
+
+QX_BEGIN_DECLS
+
+/* A host block of three dimensions: the three sizes, then the elements from byte 12. */
+typedef struct __attribute__((may_alias)) Array3DBlock {
+    int32_t dimSizes[3];
+} Array3DBlock;
+typedef Array3DBlock **Array3DHandle;
+
+#define QX_ARRAY_3D(element)                                                                       \
+    struct __attribute__((may_alias)) QXArray3D_##element {                                        \
+        int32_t dimSizes[3];                                                                       \
+    } * *
+typedef QX_ARRAY_3D(DBL) DBL3D;
+
+/** Definite integral of x by rule 0 to 3; the sign of *dt does not count. Samples left over behind
+    the last whole panel are closed by a rule of lower order at the end of the data, so that the
+    result is exact only for the polynomials of that. The code stands in *err, and a failure makes
+    the result NaN.
+    Codes: ErrEmptyInput (x is empty), ErrInvalidSelector (the rule is another), ErrSizesDisagree (x
+    has fewer samples than a panel). */
+QX_API int32_t NumerIntegration_head(QX_IN DBL1D x, QX_IN const double *dt,
+                                     QX_IN const int32_t *rule, QX_OUT double *result,
+                                     QX_OUT ErrorCode *err);
+
+/** As NumerIntegration_head, by rule 0 to 5; samples left over are taken at the start of the data,
+    by a one-sided formula of the rule's own order. The code is the function result.
+    Codes: ErrEmptyInput (x is empty), ErrSizesDisagree (x has fewer than rule + 2 samples, or than
+   2 for rules 4 and 5), ErrInvalidSelector (the rule is another). */
+QX_API ErrorCode NumerIntegration_2017_head(QX_IN DBL1D x, QX_IN const double *dt,
+                                            QX_IN const int32_t *rule, QX_OUT double *result);
+
+/** Definite integral over both dimensions by rule 0 to 3 of NumerIntegration_head: each row with
+   the step dts[0], and the rows' integrals with dts[1]. A failure makes the result NaN. Codes:
+   ErrSizesDisagree (a dimension is below 3 or shorter than a panel), ErrFewerThanTwo (fewer than
+   two steps), ErrInvalidSelector (the rule is another), ErrOutOfMemory (no scratch memory). */
+QX_API ErrorCode NumerIntegration2D_head(QX_IN DBL2D x, QX_IN DBL1D dts, uint16_t rule,
+                                         QX_OUT double *result);
+/** As NumerIntegration2D_head, by the formulas of NumerIntegration_2017_head; rules 4 and 5 are
+    refused here. */
+QX_API ErrorCode NumerIntegration2D_2017_head(QX_IN DBL2D x, QX_IN DBL1D dts, uint16_t rule,
+                                              QX_OUT double *result);
+
+/** Definite integral over three dimensions d0, d1, d2. The elements are taken as d2 planes, one
+    behind the other, of d0 rows of d1 elements, whatever the order in the block: each plane is
+    integrated as by NumerIntegration2D_head with dts[0] and dts[1], the planes with dts[2].
+    Codes: ErrSizesDisagree (a dimension is below 3 or shorter than a panel), ErrFewerThanThree
+    (fewer than three steps), ErrInvalidSelector (the rule is another), ErrOutOfMemory (no scratch
+    memory). */
+QX_API ErrorCode NumerIntegration3D_head(QX_IN DBL3D x, QX_IN DBL1D dts, uint16_t rule,
+                                         QX_OUT double *result);
+/** As NumerIntegration3D_head, by the formulas of NumerIntegration_2017_head; rules 4 and 5 are
+    refused here. */
+QX_API ErrorCode NumerIntegration3D_2017_head(QX_IN DBL3D x, QX_IN DBL1D dts, uint16_t rule,
+                                              QX_OUT double *result);
+
+/** Running integral by Simpson's rule around each sample,
+    y[i] = y[i-1] + (x[i-1] + 4 x[i] + x[i+1]) dt/6, with *initial before and *final behind the
+   data. Codes: ErrSamplingNotPositive (*dt is 0 or below), ErrEmptyInput (x is empty; over the
+   other). */
+QX_API int32_t Integral(QX_INOUT DBL1D x, QX_IN const double *initial, QX_IN const double *final,
+                        QX_IN const double *dt, QX_OUT ErrorCode *err);
+
+/** Running integral y[i] = y[i-1] + p, y[-1] = 0, with p by rule:
+
+        0  (x[i-1] + x[i]) dt/2                                        one initial value
+        1  (x[i-1] + 4 x[i] + x[i+1]) dt/6                             one initial, one final
+        2  (x[i-2] + 3 x[i-1] + 3 x[i] + x[i+1]) dt/8                  two initial, one final
+        3  (7 x[i-2] + 32 x[i-1] + 12 x[i] + 32 x[i+1] + 7 x[i+2]) dt/90      two of each
+        4  x[i-1] dt, and 5  x[i] dt, from y[0] = 0                    none
+
+    Codes: ErrSamplingNotPositive (dt is 0 or below), ErrEmptyInput (x is empty, or one value is
+    missing), ErrFewerThanTwo (one of two values is missing), ErrInvalidSelector (the rule is
+    another). */
+QX_API ErrorCode Integral90(QX_INOUT DBL1D x, QX_IN DBL1D initial, QX_IN DBL1D final, double dt,
+                            int32_t rule);
+
+/** Running integral from y[0] = 0 without values beyond the data, by rule 0 to 5: the first ones by
+    one-sided formulas, each other by a whole panel from the one a panel before.
+    Codes: ErrSamplingNotPositive (dt is 0 or below), ErrEmptyInput (x is empty), ErrSizesDisagree
+   (x has fewer than rule + 2 samples, or than 2 for rules 4 and 5), ErrInvalidSelector (the rule is
+    another). */
+QX_API ErrorCode Integral_2017(QX_INOUT DBL1D x, double dt, int32_t rule);
+
+/** Central derivative (x[i+1] - x[i-1]) / (2 dt), with *initial before and *final behind the data.
+    Codes: ErrEmptyInput (x is empty), ErrSamplingNotPositive (*dt is not above 0; over the
+    other). */
+QX_API int32_t Derivative(QX_INOUT DBL1D x, QX_IN const double *initial, QX_IN const double *final,
+                          QX_IN const double *dt, QX_OUT ErrorCode *err);
+
+/** Derivative by rule:
+
+        0  (x[i+1] - x[i-1]) / (2 dt)                                  one initial, one final
+        1  (x[i-2] - 8 x[i-1] + 8 x[i+1] - x[i+2]) / (12 dt)           two of each
+        2  (x[i+1] - x[i]) / dt                                        one final
+        3  (x[i] - x[i-1]) / dt                                        one initial
+
+    Codes: ErrEmptyInput (x is empty), ErrSamplingNotPositive (*dt is 0 or below), ErrEmptyInput
+   (too few values beyond the data), ErrInvalidSelector (the rule is another). */
+QX_API ErrorCode Derivative85(QX_INOUT DBL1D x, QX_IN DBL1D initial, QX_IN DBL1D final,
+                              QX_IN const double *dt, int32_t rule);
+
+QX_END_DECLS
+
+#endif

@@ -1,0 +1,178 @@
+#include "fit/interpolation.h"
+
+#include "frame/scratch.h"
+
+#include <cmath>
+
+namespace qx {
+
+namespace {
+
+typedef Scratch<ElementType::DBL> Column;
+
+// A tableau of corrections: the columns c and d, both y at first, d moved by an offset.
+ErrorCode StartTableau(const Table &table, Column &c, Column &d, double offset) {
+    if (const ErrorCode failed = c.allocate(table.n))
+        return failed;
+    if (const ErrorCode failed = d.allocate(table.n))
+        return failed;
+    for (int32_t i = 0; i < table.n; ++i) {
+        c[i] = table.y[i];
+        d[i] = table.y[i] + offset;
+    }
+    return 0;
+}
+
+int32_t NearestPoint(const Table &table, double xi) {
+    int32_t nearest = 0;
+    double least = std::fabs(xi - table.x[0]);
+    for (int32_t i = 1; i < table.n; ++i) {
+        const double distance = std::fabs(xi - table.x[i]);
+        if (distance < least) {
+            least = distance;
+            nearest = i;
+        }
+    }
+    return nearest;
+}
+
+// Goes through the tableau from the nearest point, always to the correction that keeps the points
+// in use centred on xi. `advance(i, m)` replaces c[i] and d[i] by those of column m.
+template <class Advance>
+ErrorCode WalkTableau(const Table &table, int32_t nearest, Column &c, Column &d, double *yi,
+                      double *dy, const Advance &advance) {
+    int32_t at = nearest - 1;
+    double sum = table.y[nearest];
+    double correction = 0.0;
+    for (int32_t m = 1; m < table.n; ++m) {
+        for (int32_t i = 0; i < table.n - m; ++i)
+            if (const ErrorCode bad = advance(i, m))
+                return bad;
+        correction = 2 * (int64_t{at} + 1) < table.n - m ? c[at + 1] : d[at--];
+        sum += correction;
+    }
+    *yi = sum;
+    *dy = correction;
+    return 0;
+}
+
+} // namespace
+
+ErrorCode InterpolateByPolynomial(const Table &table, double xi, double *yi, double *dy) {
+    if (table.n < 1)
+        return ErrEmptyInput;
+    Column c;
+    Column d;
+    if (const ErrorCode failed = StartTableau(table, c, d, 0.0))
+        return failed;
+    const DBL *x = table.x;
+    return WalkTableau(table, NearestPoint(table, xi), c, d, yi, dy, [&](int32_t i, int32_t m) {
+        if (x[i + m] == x[i])
+            return ErrorCode{ErrAbscissaeOrder};
+        const double quotient = (c[i + 1] - d[i]) / (x[i] - x[i + m]);
+        d[i] = (x[i + m] - xi) * quotient;
+        c[i] = (x[i] - xi) * quotient;
+        return ErrorCode{0};
+    });
+}
+
+ErrorCode InterpolateByRational(const Table &table, double xi, double *yi, double *dy) {
+    if (table.n < 1)
+        return ErrEmptyInput;
+    const DBL *x = table.x;
+    const int32_t nearest = NearestPoint(table, xi);
+    if (std::fabs(xi - x[nearest]) == 0.0) {
+        *yi = table.y[nearest];
+        *dy = 0.0;
+        return 0;
+    }
+    Column c;
+    Column d;
+    if (const ErrorCode failed = StartTableau(table, c, d, 1e-10)) // against 0 / 0 in the tableau
+        return failed;
+    return WalkTableau(table, nearest, c, d, yi, dy, [&](int32_t i, int32_t m) {
+        const double difference = c[i + 1] - d[i];
+        const double t = (x[i] - xi) * d[i] / (x[i + m] - xi);
+        const double denominator = t - c[i + 1];
+        if (denominator == 0.0)
+            return ErrorCode{ErrDuplicateAbscissa}; // a pole
+        const double quotient = difference / denominator;
+        d[i] = c[i + 1] * quotient;
+        c[i] = t * quotient;
+        return ErrorCode{0};
+    });
+}
+
+namespace {
+
+// A slope that is larger, or NaN, asks for a natural end.
+bool IsSlope(double slope) { return slope <= 9.9e+29; }
+
+ErrorCode CheckAbscissae(const DBL *x, int32_t n) {
+    for (int32_t i = 1; i < n; ++i)
+        if (x[i] == x[i - 1] || (i > 1 && x[i] == x[i - 2]))
+            return ErrAbscissaeOrder;
+    return 0;
+}
+
+} // namespace
+
+// The tridiagonal system of the spline, by one pass forward, which leaves the ratios of the
+// elimination in s and the right side in u, and one backward.
+ErrorCode SplineSecondDerivatives(const Table &table, double firstSlope, double lastSlope, DBL *s) {
+    const auto [x, y, n] = table;
+    if (n < 1)
+        return ErrEmptyInput;
+    if (const ErrorCode bad = CheckAbscissae(x, n))
+        return bad;
+    s[0] = 0.0;
+    if (n == 1) // no segment
+        return 0;
+    Column u;
+    if (const ErrorCode failed = u.allocate(n))
+        return failed;
+    u[0] = 0.0;
+    if (IsSlope(firstSlope)) {
+        s[0] = -0.5;
+        u[0] = 3.0 / (x[1] - x[0]) * ((y[1] - y[0]) / (x[1] - x[0]) - firstSlope);
+    }
+    for (int32_t i = 1; i < n - 1; ++i) {
+        const double sig = (x[i] - x[i - 1]) / (x[i + 1] - x[i - 1]);
+        const double p = sig * s[i - 1] + 2.0;
+        const double bend =
+            (y[i + 1] - y[i]) / (x[i + 1] - x[i]) - (y[i] - y[i - 1]) / (x[i] - x[i - 1]);
+        s[i] = (sig - 1.0) / p;
+        u[i] = (6.0 * bend / (x[i + 1] - x[i - 1]) - sig * u[i - 1]) / p;
+    }
+    const double h = x[n - 1] - x[n - 2];
+    const bool isClamped = IsSlope(lastSlope);
+    const double qn = isClamped ? 0.5 : 0.0;
+    const double un = isClamped ? 3.0 / h * (lastSlope - (y[n - 1] - y[n - 2]) / h) : 0.0;
+    s[n - 1] = (un - qn * u[n - 2]) / (qn * s[n - 2] + 1.0);
+    for (int32_t k = n - 2; k >= 0; --k)
+        s[k] = s[k] * s[k + 1] + u[k];
+    return 0;
+}
+
+ErrorCode InterpolateBySpline(const Table &table, const DBL *s, double xi, double *yi) {
+    const auto [x, y, n] = table;
+    if (n < 1)
+        return ErrEmptyInput;
+    const bool ascends = x[n - 1] > x[0];
+    int32_t lo = 0;
+    int32_t hi = n - 1;
+    while (hi - lo > 1) {
+        const int32_t mid = lo + (hi - lo) / 2;
+        const bool isBelow = ascends ? x[mid] > xi : x[mid] < xi;
+        (isBelow ? hi : lo) = mid;
+    }
+    const double h = x[hi] - x[lo];
+    if (h == 0.0)
+        return ErrAbscissaeOrder;
+    const double a = (x[hi] - xi) / h;
+    const double b = (xi - x[lo]) / h;
+    *yi = y[lo] * a + y[hi] * b + ((b * b * b - b) * s[hi] + (a * a * a - a) * s[lo]) * h * h / 6.0;
+    return 0;
+}
+
+} // namespace qx

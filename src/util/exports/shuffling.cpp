@@ -1,0 +1,85 @@
+#include "qx/shuffling.h"
+#include "frame/export.h"
+#include "util/shuffle.h"
+
+namespace qx {
+namespace {
+
+// Shuffles the numbers 0 to n - 1, and whatever `exchange` exchanges along with them.
+template <class Exchange>
+Outcome Riffle(Out<I32_1D> &indices, int32_t n, int32_t seed, RandomState *state, bool isUnbiased,
+               const Exchange &exchange) {
+    if (n < 1)
+        return ErrEmptyInput;
+    if (const Outcome bad = indices.resize(n))
+        return bad;
+    I32 *order = indices.data();
+    for (int32_t i = 0; i < n; ++i)
+        order[i] = i;
+    if (seed >= 0)
+        RandomSeed(seed, *state);
+    Shuffle(n, isUnbiased, *state, [&](int32_t i, int32_t j) {
+        const int32_t held = order[i];
+        order[i] = order[j];
+        order[j] = held;
+        exchange(i, j);
+    });
+    return 0;
+}
+
+template <class Array>
+Outcome RiffleArray(InOut<Array> x, Out<I32_1D> indices, int32_t seed, RandomState *state,
+                    int32_t unbiased) {
+    return Riffle(indices, x.size(), seed, state, unbiased != 0,
+                  [elements = x.data()](int32_t i, int32_t j) {
+                      const auto held = elements[i];
+                      elements[i] = elements[j];
+                      elements[j] = held;
+                  });
+}
+
+Outcome RiffleNumbers(Out<I32_1D> indices, int32_t count, int32_t seed, RandomState *state,
+                      int32_t unbiased) {
+    return Riffle(indices, count, seed, state, unbiased != 0, [](int32_t, int32_t) {});
+}
+
+} // namespace
+} // namespace qx
+
+using qx::Returned;
+
+ErrorCode RiffleArrayDBL2012_head(DBL1D x, I32_1D indices, int32_t seed, RandomState *state,
+                                  int32_t unbiased) {
+    return Returned(qx::RiffleArray<DBL1D>, x, indices, seed, state, unbiased);
+}
+
+ErrorCode RiffleArrayDBL_head(DBL1D x, I32_1D indices, int32_t seed, RandomState *state) {
+    return RiffleArrayDBL2012_head(x, indices, seed, state, 0);
+}
+
+ErrorCode RiffleArrayCDB2012_head(CDB1D x, I32_1D indices, int32_t seed, RandomState *state,
+                                  int32_t unbiased) {
+    return Returned(qx::RiffleArray<CDB1D>, x, indices, seed, state, unbiased);
+}
+
+ErrorCode RiffleArrayCDB_head(CDB1D x, I32_1D indices, int32_t seed, RandomState *state) {
+    return RiffleArrayCDB2012_head(x, indices, seed, state, 0);
+}
+
+ErrorCode RiffleArrayInt2012_head(I32_1D x, I32_1D indices, int32_t seed, RandomState *state,
+                                  int32_t unbiased) {
+    return Returned(qx::RiffleArray<I32_1D>, x, indices, seed, state, unbiased);
+}
+
+ErrorCode RiffleArrayInt_head(I32_1D x, I32_1D indices, int32_t seed, RandomState *state) {
+    return RiffleArrayInt2012_head(x, indices, seed, state, 0);
+}
+
+ErrorCode RiffleIntNum2012_head(I32_1D indices, int32_t count, int32_t seed, RandomState *state,
+                                int32_t unbiased) {
+    return Returned(qx::RiffleNumbers, indices, count, seed, state, unbiased);
+}
+
+ErrorCode RiffleIntNum_head(I32_1D indices, int32_t count, int32_t seed, RandomState *state) {
+    return RiffleIntNum2012_head(indices, count, seed, state, 0);
+}

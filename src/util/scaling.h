@@ -1,0 +1,37 @@
+#ifndef QX_UTIL_SCALING_H
+#define QX_UTIL_SCALING_H
+
+#include "frame/widths.h"
+#include "qx/errors.h"
+#include "qx/types.h"
+
+namespace qx {
+
+// In place over n elements, n >= 1; include/qx/scaling.h tells what they do.
+void ScaleToUnitRange(DBL *x, int32_t n, double &scale, double &offset);
+void ScaleByMagnitude(DBL *x, int32_t n, double &scale);
+void Standardise(DBL *x, int32_t n, double &mean, double &deviation);
+// ErrInvalidSelector.
+ErrorCode UnwrapPhase(DBL *x, int32_t n, int32_t mode);
+
+// The extremes of what is no NaN; crossed infinities where there is nothing.
+struct Range {
+    double lowest;
+    double highest;
+};
+QX_BY_WIDTH(Range, RangeOf, (const DBL *x, int32_t n))
+// max |x|, at least 0; NaN takes no part.
+QX_BY_WIDTH(double, LargestMagnitude, (const DBL *x, int32_t n))
+// sum(x) and sum((x - centre)^2): sixteen sums, of the elements i, i + 16, ..., added up by halves.
+QX_BY_WIDTH(double, SumOf, (const DBL *x, int32_t n))
+QX_BY_WIDTH(double, SumOfSquares, (const DBL *x, int32_t n, double centre))
+
+QX_BY_WIDTH(void, ShiftAndMultiply, (DBL * x, int32_t n, double shift, double factor))
+QX_BY_WIDTH(void, MultiplyAndShift, (DBL * x, int32_t n, double factor, double shift))
+QX_BY_WIDTH(void, MultiplyAndDivide, (DBL * x, int32_t n, double factor, double divisor))
+// Each element moved by whole periods to within half a period of the one before.
+QX_BY_WIDTH(void, Unwrap, (DBL * x, int32_t n, double period))
+
+} // namespace qx
+
+#endif

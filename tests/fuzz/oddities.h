@@ -1,0 +1,45 @@
+#ifndef QX_TESTS_FUZZ_ODDITIES_H
+#define QX_TESTS_FUZZ_ODDITIES_H
+
+#include <cstring>
+
+namespace qx::test {
+
+// What exports are known to do against the rules that the fuzzer holds all others to.
+enum class Oddity {
+    OldContentStays,   // a success that leaves in an output what it held
+    SizeBeyondBlock,   // an array whose size is set although the host refused the resize
+    DependsOnState,    // a result that depends on calls before, for a state of the process
+    TimeFollowsNumber, // time that grows with a number by value, which therefore stays small here
+};
+
+struct KeptOddity {
+    const char *name;
+    Oddity oddity;
+    const char *reason;
+};
+
+constexpr KeptOddity keptOddities[] = {
+    {"Convolution", Oddity::OldContentStays, "with an algorithm that does not exist"},
+    {"Rxy", Oddity::OldContentStays, "with an algorithm that does not exist"},
+    {"Rxy80", Oddity::OldContentStays, "with an algorithm that does not exist"},
+    {"AutoCorrelation", Oddity::SizeBeyondBlock, "the resize is not looked at"},
+    {"AutoCorrelation80", Oddity::SizeBeyondBlock, "the resize is not looked at"},
+    {"Deconvolution", Oddity::SizeBeyondBlock, "the resize is not looked at"},
+    {"ReComplexModulatorH", Oddity::OldContentStays, "where x is empty"},
+    {"ReDZTH", Oddity::TimeFollowsNumber, "S transforms, however few values there are"},
+    {"ReDZTH_IDP", Oddity::TimeFollowsNumber, "as ReDZTH"},
+    {"CxDZTH", Oddity::TimeFollowsNumber, "as ReDZTH"},
+    {"CxDZTH_IDP", Oddity::TimeFollowsNumber, "as ReDZTH"},
+};
+
+inline bool IsKept(const char *name, Oddity oddity) {
+    for (const KeptOddity &kept : keptOddities)
+        if (std::strcmp(kept.name, name) == 0 && kept.oddity == oddity)
+            return true;
+    return false;
+}
+
+} // namespace qx::test
+
+#endif
