@@ -14,7 +14,8 @@ from . import arrays, plans
 from .library import library
 
 C_TYPES = {"I16": ctypes.c_int16, "I32": ctypes.c_int32, "U8": ctypes.c_uint8,
-           "U16": ctypes.c_uint16, "U32": ctypes.c_uint32, "SGL": ctypes.c_float, "DBL": ctypes.c_double}
+           "U16": ctypes.c_uint16, "U32": ctypes.c_uint32, "SGL": ctypes.c_float,
+           "DBL": ctypes.c_double}
 COMPLEX_PARTS = {"CSG": ctypes.c_float, "CDB": ctypes.c_double}
 RESULTS = {"ErrorCode": ctypes.c_int32, "int32_t": ctypes.c_int32, "uint32_t": ctypes.c_uint32,
            "uint8_t": ctypes.c_uint8, "double": ctypes.c_double, "DBL": ctypes.c_double,

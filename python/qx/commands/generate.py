@@ -1,0 +1,49 @@
+"""The command generate."""
+
+import argparse
+
+from .values import positive
+
+# Kept here for the help, so that the libraries are loaded only to generate; a test holds the list to
+# the signals that there are.
+NAMES = ("sine square triangle sawtooth chirp white gauss periodic gamma poisson binomial ramp pulse "
+         "impulse sinc gauss-pulse monopulse triangle-pulse").split()
+
+
+def seed(text):
+    value = int(text)
+    if not 1 <= value < 2**31:
+        raise argparse.ArgumentTypeError(f"{text} is not between 1 and 2147483647")
+    return value
+
+
+def generate(options):
+    from .. import generation
+    samples = generation.generate(options)
+    generation.write(options.target, samples, options.rate)
+    print(f"{options.target}: {len(samples)} samples at {options.rate:g} Hz")
+
+
+def add(commands):
+    command = commands.add_parser("generate", help="writes a wave, a noise or a pulse, CSV or WAV")
+    command.add_argument("signal", choices=NAMES, metavar="SIGNAL", help=", ".join(NAMES))
+    command.add_argument("target", metavar="OUT.wav|OUT.csv")
+    command.add_argument("--rate", type=positive, default=44100.0, metavar="HZ",
+                         help="samples per second, 44100 by default")
+    command.add_argument("--seconds", type=positive, default=1.0, help="length, 1 by default")
+    command.add_argument("--amplitude", type=float, default=1.0,
+                         help="peak, or standard deviation of gauss, or factor; 1 by default")
+    command.add_argument("--frequency", type=float, default=100.0, metavar="HZ",
+                         help="of waves and pulses, 100 by default")
+    command.add_argument("--to", type=float, default=1000.0, metavar="HZ",
+                         help="where a chirp ends, 1000 by default")
+    command.add_argument("--phase", type=float, default=0.0, metavar="DEGREES")
+    command.add_argument("--duty", type=float, default=50.0, metavar="PERCENT")
+    command.add_argument("--delay", type=float, default=0.0, metavar="SECONDS", help="of pulses")
+    command.add_argument("--width", type=positive, default=0.1, metavar="SECONDS", help="of pulses")
+    command.add_argument("--seed", type=seed, default=1, help="of noises, 1 by default")
+    command.add_argument("--order", type=int, default=1, help="of gamma noise")
+    command.add_argument("--mean", type=float, default=1.0, help="of Poisson noise")
+    command.add_argument("--trials", type=int, default=1, help="of binomial noise")
+    command.add_argument("--probability", type=float, default=0.5, help="of binomial noise")
+    command.set_defaults(run=generate)

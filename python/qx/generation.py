@@ -1,0 +1,69 @@
+"""Signals by name: waves, noises and patterns of a given number of samples."""
+
+import numpy as np
+
+from .calls import call
+
+STATE = {"s1": 0, "s2": 0, "s3": 0}  # every seed restarts the stream
+
+
+def _wave(export, *after):
+    """A continuous wave; `after` names the options behind the phase."""
+    def generate(n, o):
+        return call(export, n, o.amplitude, o.frequency / o.rate, o.phase,
+                    *(getattr(o, name) for name in after))[0]
+    return generate
+
+
+def _pulse(o, n, export, *arguments):
+    return call(export, np.empty(0), n, *arguments)
+
+
+SIGNALS = {
+    "sine": _wave("SineWaveCIN"),
+    "square": _wave("SquareWaveCIN", "duty"),
+    "triangle": _wave("TriangleWaveCIN"),
+    "sawtooth": _wave("SawtoothWaveCIN"),
+    "chirp": lambda n, o: call("ChirpCIN", n, o.amplitude, o.frequency / o.rate, o.to / o.rate),
+    "white": lambda n, o: call("white", n, o.amplitude, o.seed, STATE)[0],
+    "gauss": lambda n, o: call("Gauss", n, o.amplitude, o.seed, STATE, {})[0],
+    "periodic": lambda n, o: call("PeriodNoise", n, o.amplitude, o.seed, STATE)[0],
+    "gamma": lambda n, o: o.amplitude * call("GammaNoiseH", n, o.order, o.seed, STATE)[0],
+    "poisson": lambda n, o: o.amplitude * call("PoissonNoiseH", n, o.mean, o.seed, STATE)[0],
+    "binomial": lambda n, o: o.amplitude * call("BinomialNoiseH", n, o.trials, o.probability,
+                                                o.seed, STATE, {})[0],
+    "ramp": lambda n, o: call("RampPtrn", n, -o.amplitude, o.amplitude),
+    "pulse": lambda n, o: call("PulsePtrn", n, o.amplitude, round(o.delay * o.rate),
+                               round(o.width * o.rate)),
+    "impulse": lambda n, o: call("ImpulsePtrn", n, o.amplitude, round(o.delay * o.rate)),
+    "sinc": lambda n, o: call("SincWave", n, o.amplitude, o.delay * 2 * o.frequency,
+                              2 * o.frequency / o.rate),
+    "gauss-pulse": lambda n, o: _pulse(o, n, "GaussPulseH", o.amplitude, o.delay, 1 / o.rate,
+                                       o.frequency, 0.5, 6.0),
+    "monopulse": lambda n, o: _pulse(o, n, "GaussMonopulseH", 1 / o.rate, o.delay, o.frequency,
+                                     o.amplitude),
+    "triangle-pulse": lambda n, o: _pulse(o, n, "AperiodTriangleH", o.amplitude, o.delay,
+                                          1 / o.rate, o.width, 0.5),
+}
+
+
+def generate(options):
+    """The samples that the options of the command ask for."""
+    n = round(options.seconds * options.rate)
+    return SIGNALS[options.signal](n, options)
+
+
+def write(path, samples, rate):
+    """A table of times and values, or audio of 32-bit floats, by the name's ending."""
+    ending = path.lower().rpartition(".")[2]
+    if ending == "csv":
+        times = np.arange(len(samples)) / rate
+        np.savetxt(path, np.column_stack([times, samples]), "%.17g", ",",
+                   header="time [s],x", comments="")
+    elif ending == "wav":
+        import soundfile
+        if rate != int(rate):
+            raise ValueError(f"a WAV file needs a whole number of samples per second, not {rate}")
+        soundfile.write(path, samples, int(rate), "FLOAT")
+    else:
+        raise ValueError(f"{path}: the name must end in .csv or .wav")
