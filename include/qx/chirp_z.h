@@ -25,12 +25,13 @@ QX_API ErrorCode CxChirpZT_head(QX_IN CDB1D in, QX_IN const CDB *a, QX_IN const 
 
 /** The inverse: the sequence of n values whose transform is `in`. A smaller count takes as many
     points of the input, around the one that is nearest to the unit circle, and gives a sequence of
-    that length; below 1 it means n. Costs n^2 complex powers. On the whole circle the error is that
-    of a transform; on an arc or off the circle it grows exponentially with n.
+    that length; below 1 it means n. Costs n^2 complex powers. On the whole circle the relative
+    error grows a little faster than n, 5e-12 for 512 values; on an arc or off the circle it grows
+    exponentially with n.
     Codes: ErrEmptyInput (in is empty), ErrSizesDisagree (count is above n), ErrOutOfMemory (the
-   host refuses out, or no memory), ErrNonFiniteInput (a, or then w, is not finite),
+    host refuses out, or no memory), ErrNonFiniteInput (a, or then w, is not finite),
     ErrNotStrictlyPositive (a, or then w, is 0), ErrDegenerateValue (1/a is 0, or two points agree
-   to rounding). */
+    to rounding). */
 QX_API ErrorCode InvChirpZT_head(QX_IN CDB1D in, QX_IN const CDB *a, QX_IN const CDB *w,
                                  int32_t count, QX_OUT CDB1D out);
 
