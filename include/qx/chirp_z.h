@@ -11,11 +11,11 @@
 QX_BEGIN_DECLS
 
 /** out[m] = sum over k from 0 to n-1 of in[k] a^(-k) w^(k m), for m from 0 to count-1; a count
-   below 1 means n. method: 0 the direct sum, a complex power for each term; 1 Bluestein's form, one
-    convolution by transforms. Off the unit circle powers with exponents up to n^2 / 2 may leave the
-    range of double in method 1.
+    below 1 means n. method: 0 the direct sum, a complex power for each term; 1 Bluestein's form,
+    one convolution by transforms. Off the unit circle powers with exponents up to n^2 / 2 may
+    leave the range of double in method 1.
     Codes: ErrEmptyInput (in is empty), ErrInvalidSelector (no such method), ErrOutOfMemory (the
-   host refuses out, or no memory), ErrNonFiniteInput (a, or then w, is not finite),
+    host refuses out, or no memory), ErrNonFiniteInput (a, or then w, is not finite),
     ErrNotStrictlyPositive (a, or then w, is 0). */
 QX_API ErrorCode ChirpZT_head(QX_IN DBL1D in, QX_IN const CDB *a, QX_IN const CDB *w, int32_t count,
                               uint32_t method, QX_OUT CDB1D out);
@@ -24,8 +24,8 @@ QX_API ErrorCode CxChirpZT_head(QX_IN CDB1D in, QX_IN const CDB *a, QX_IN const 
                                 int32_t count, uint32_t method, QX_OUT CDB1D out);
 
 /** The inverse: the sequence of n values whose transform is `in`. A smaller count takes as many
-    points of the input, around the one that is nearest to the unit circle, and gives a sequence of
-    that length; below 1 it means n. Costs n^2 complex powers. On the whole circle the relative
+    points of the input, around the one that is nearest to the unit circle, and gives a sequence
+    of that length; below 1 it means n. Costs n^2 complex powers. On the whole circle the relative
     error grows a little faster than n, 5e-12 for 512 values; on an arc or off the circle it grows
     exponentially with n.
     Codes: ErrEmptyInput (in is empty), ErrSizesDisagree (count is above n), ErrOutOfMemory (the

@@ -30,9 +30,9 @@ QX_API int32_t Convolution(QX_IN DBL1D x, QX_IN DBL1D y, QX_OUT DBL1D out,
 QX_API ErrorCode CxConvolution(QX_IN CDB1D x, QX_IN CDB1D y, QX_OUT CDB1D out, int32_t algorithm,
                                int32_t correlate, int32_t normalization);
 
-/** Cross-correlation: out[t] = sum over j of x[nx - 1 - t + j] y[j], nx + ny - 1 values, element nx
-    - 1 being lag zero. The code is in *err. Any other algorithm leaves in out what stands there,
-    normalized. An array with itself takes two transforms in place of three.
+/** Cross-correlation: out[t] = sum over j of x[nx - 1 - t + j] y[j], nx + ny - 1 values, element
+    nx - 1 being lag zero. The code is in *err. Any other algorithm leaves in out what stands
+    there, normalized. An array with itself takes two transforms in place of three.
     Codes: ErrEmptyInput (x or y is empty), ErrOutOfMemory (the host refuses the output, or no
     memory), ErrInvalidSelector (no such normalization). A failure empties out. */
 QX_API int32_t Rxy80(QX_IN DBL1D x, QX_IN DBL1D y, QX_OUT DBL1D out, QX_IN const int32_t *algorithm,
@@ -54,12 +54,13 @@ QX_API int32_t AutoCorrelation80(QX_INOUT DBL1D x, int32_t normalization, QX_OUT
     Codes: ErrEmptyInput (x is empty), ErrOutOfMemory (no memory). */
 QX_API int32_t AutoCorrelation(QX_INOUT DBL1D x, QX_OUT ErrorCode *err);
 
-/** Replaces xy by q, nxy - ny + 1 values, with xy = q convolved with y: by division of the spectra,
-    or, if that of y looks singular, by long division of the series, which leading zeros of y do not
-    disturb. What is no multiple of y leaves its remainder in q. The code is in *err and the
-   function result. Codes: ErrLengthTooLarge (an input of more than 8388608 values), ErrEmptyInput
-   (xy or y is empty), ErrSizesDisagree (y is the longer one), ErrOutOfMemory (no memory). A failure
-   empties xy. */
+/** Replaces xy by q, nxy - ny + 1 values, with xy = q convolved with y: by division of the
+    spectra, or, if that of y looks singular, by long division of the series, which leading zeros
+    of y do not disturb. What is no multiple of y leaves its remainder in q. The code is in *err
+    and the function result.
+    Codes: ErrLengthTooLarge (an input of more than 8388608 values), ErrEmptyInput (xy or y is
+    empty), ErrSizesDisagree (y is the longer one), ErrOutOfMemory (no memory). A failure empties
+    xy. */
 QX_API int32_t Deconvolution(QX_INOUT DBL1D xy, QX_IN DBL1D y, QX_OUT ErrorCode *err);
 
 QX_END_DECLS

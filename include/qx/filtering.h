@@ -21,10 +21,10 @@
 QX_BEGIN_DECLS
 
 /** Filters x in place, in direct form. The states are kept from the last call if *keepState is 1
-    and cleared otherwise. The code is in *err; where the host refuses a state, the function result
-    is its status and that state is emptied.
-    Codes: ErrEmptyInput (x is empty), ErrSizesDisagree (a without b; x is emptied), ErrOutOfMemory
-    (the host refuses a state; or no memory, then x is emptied). */
+    and cleared otherwise. The code is in *err; where the host refuses a state, the function
+    result is its status and that state is emptied.
+    Codes: ErrEmptyInput (x is empty), ErrSizesDisagree (a without b; x is emptied),
+    ErrOutOfMemory (the host refuses a state; or no memory, then x is emptied). */
 QX_API int32_t IIR_Filter(QX_INOUT DBL1D x, QX_IN DBL1D a, QX_IN DBL1D b, QX_INOUT DBL1D xState,
                           QX_INOUT DBL1D yState, QX_IN const uint8_t *keepState,
                           QX_OUT ErrorCode *err);
@@ -37,16 +37,17 @@ QX_API int32_t CxIIR_Filter_H(QX_INOUT CDB1D x, QX_IN CDB1D a, QX_IN CDB1D b, QX
                               QX_INOUT CDB1D yState, QX_IN const uint8_t *keepState,
                               QX_OUT ErrorCode *err);
 
-/** A real signal through a filter of complex coefficients, in direct form; without any coefficients
-    y is x. The states are kept from the last call if *keepState is 1 and cleared otherwise.
+/** A real signal through a filter of complex coefficients, in direct form; without any
+    coefficients y is x. The states are kept from the last call if *keepState is 1 and cleared
+    otherwise.
     Codes: ErrEmptyInput (x is empty), ErrSizesDisagree (a without b), ErrOutOfMemory (the host
     refuses y or a state, or no memory). A failure empties y, and a refused state. */
 QX_API ErrorCode CxIIRReSig_Filter_H(QX_IN DBL1D x, QX_OUT CDB1D y, QX_IN CDB1D a, QX_IN CDB1D b,
                                      QX_INOUT DBL1D xState, QX_INOUT CDB1D yState,
                                      QX_IN const uint8_t *keepState);
 
-/** Filters x in place, in direct form, with the state of x and, behind it, that of y in one array.
-    It is kept from the last call if *keepState is 1 and cleared otherwise.
+/** Filters x in place, in direct form, with the state of x and, behind it, that of y in one
+    array. It is kept from the last call if *keepState is 1 and cleared otherwise.
     Codes: ErrEmptyInput (x is empty), ErrSizesDisagree (a without b), ErrOutOfMemory (the host
     refuses the state, or no memory). A failure empties x and the state. */
 QX_API ErrorCode IIR_Filter_OneState(QX_INOUT DBL1D x, QX_IN DBL1D a, QX_IN DBL1D b,
@@ -56,11 +57,13 @@ QX_API ErrorCode CxSigIIR_Filter_OneState(QX_INOUT CDB1D x, QX_IN DBL1D a, QX_IN
                                           QX_INOUT CDB1D state, QX_IN const uint8_t *keepState);
 
 /** Filters x in place by a cascade of the given form; without any coefficients x stays as it is.
-   The state is kept from the last call if *keepState is 1 and cleared otherwise. The code is in
-   *err; where the host refuses the state, the function result is its status and the state is
-   emptied. Codes: ErrEmptyInput (x is empty), ErrSizesDisagree (a without b, or b without a; x is
-   emptied), ErrInvalidSelector (no such form; x stays as it is), ErrOutOfMemory (the host refuses
-   the state), ErrCoefficientSizes (the sizes of a and b do not fit the form; x is emptied). */
+    The state is kept from the last call if *keepState is 1 and cleared otherwise. The code is in
+    *err; where the host refuses the state, the function result is its status and the state is
+    emptied.
+    Codes: ErrEmptyInput (x is empty), ErrSizesDisagree (a without b, or b without a; x is
+    emptied), ErrInvalidSelector (no such form; x stays as it is), ErrOutOfMemory (the host
+    refuses the state), ErrCoefficientSizes (the sizes of a and b do not fit the form; x is
+    emptied). */
 QX_API int32_t IIR_Filter2(QX_INOUT DBL1D x, QX_IN const int32_t *form, QX_IN DBL1D a,
                            QX_IN DBL1D b, QX_INOUT DBL1D state, QX_IN const uint8_t *keepState,
                            QX_OUT ErrorCode *err);
@@ -69,13 +72,13 @@ QX_API int32_t CxSigIIR_Filter2(QX_INOUT CDB1D x, QX_IN const int32_t *form, QX_
                                 QX_IN DBL1D b, QX_INOUT CDB1D state, QX_IN const uint8_t *keepState,
                                 QX_OUT ErrorCode *err);
 
-/** Filters one sample in place. mode: 0 a cascade of second-order sections, 1 of fourth-order ones,
-    2 direct form with its state in one array, 3 the same as an FIR filter, which takes no notice of
-    a unless b is empty. The state is cleared if *reset is not 0: the opposite of the exports for
-    arrays.
+/** Filters one sample in place. mode: 0 a cascade of second-order sections, 1 of fourth-order
+    ones, 2 direct form with its state in one array, 3 the same as an FIR filter, which takes no
+    notice of a unless b is empty. The state is cleared if *reset is not 0: the opposite of the
+    exports for arrays.
     Codes: ErrInvalidSelector (no such mode), ErrSizesDisagree (a without b; in a cascade also b
-    without a), ErrOutOfMemory (the host refuses the state), ErrCoefficientSizes (the sizes of a and
-    b do not fit the cascade). A failure empties the state and leaves 0 in *x. */
+    without a), ErrOutOfMemory (the host refuses the state), ErrCoefficientSizes (the sizes of a
+    and b do not fit the cascade). A failure empties the state and leaves 0 in *x. */
 QX_API ErrorCode IIR_Filter_PtbyPt(QX_INOUT DBL *x, int32_t mode, QX_IN DBL1D a, QX_IN DBL1D b,
                                    QX_INOUT DBL1D state, QX_IN const uint8_t *reset);
 /** As IIR_Filter_PtbyPt, for a complex sample: its parts run through the same coefficients. */

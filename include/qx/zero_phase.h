@@ -11,21 +11,21 @@
 
 QX_BEGIN_DECLS
 
-/** Filters x in place by a filter in direct form, as of IIR_Filter; without a it is an FIR filter,
-    without both x stays as it is. keepState 0 clears the states.
-    Codes: ErrEmptyInput (x is empty), ErrSizesDisagree (a without b), the host's status (it refuses
-    a state), ErrOutOfMemory (no memory). A failure leaves x as it is; the last two empty all four
-    states. */
+/** Filters x in place by a filter in direct form, as of IIR_Filter; without a it is an FIR
+    filter, without both x stays as it is. keepState 0 clears the states.
+    Codes: ErrEmptyInput (x is empty), ErrSizesDisagree (a without b), the host's status (it
+    refuses a state), ErrOutOfMemory (no memory). A failure leaves x as it is; the last two empty
+    all four states. */
 QX_API ErrorCode zeroPhaseFiltH(QX_INOUT DBL1D x, QX_IN DBL1D a, QX_IN DBL1D b,
                                 QX_INOUT DBL1D xStateForward, QX_INOUT DBL1D xStateBackward,
                                 QX_INOUT DBL1D yStateForward, QX_INOUT DBL1D yStateBackward,
                                 int32_t keepState);
 
-/** Filters x in place by a cascade of the given form, as of IIR_Filter2; without any coefficients x
-    stays as it is. keepState 0 clears the states.
+/** Filters x in place by a cascade of the given form, as of IIR_Filter2; without any coefficients
+    x stays as it is. keepState 0 clears the states.
     Codes: ErrEmptyInput (x is empty), ErrSizesDisagree (a without b, or b without a), the host's
     status (it refuses a state), ErrInvalidSelector (no such form), ErrCoefficientSizes (the sizes
-   of a and b do not fit the form), ErrOutOfMemory (no memory). A failure leaves x as it is. */
+    of a and b do not fit the form), ErrOutOfMemory (no memory). A failure leaves x as it is. */
 QX_API ErrorCode zeroPhaseCascadeFiltH(QX_INOUT DBL1D x, QX_IN const int32_t *form, QX_IN DBL1D a,
                                        QX_IN DBL1D b, QX_INOUT DBL1D stateForward,
                                        QX_INOUT DBL1D stateBackward, int32_t keepState);
