@@ -1,8 +1,8 @@
 #include "spectra/power_spectrum.h"
 
 #include "fft/plan.h"
-#include "frame/lanes.h"
 #include "frame/scratch.h"
+#include "spectra/powers.h"
 
 #include <cstddef>
 
@@ -10,17 +10,6 @@ namespace qx {
 namespace {
 
 double SpectrumScale(int32_t n) { return 1.0 / (static_cast<double>(n) * static_cast<double>(n)); }
-
-// The power at frequencies k onward, one for each lane, and at the opposite frequencies.
-template <class L>
-void PowerPairs(const DBL *h, std::ptrdiff_t k, std::ptrdiff_t n, double scale, DBL *x) {
-    const std::ptrdiff_t opposite = n - k - (L::count - 1);
-    const L re = L::load(h + k);
-    const L im = L::load(h + opposite).reversed();
-    const L power = (re * re + im * im) * L(scale);
-    power.store(x + k);
-    power.reversed().store(x + opposite);
-}
 
 } // namespace
 
@@ -38,20 +27,9 @@ ErrorCode PowerSpectrumReal(DBL *x, int32_t n) {
     if (!plan)
         return ErrOutOfMemory;
     DBL *const h = work.data();
-    const double s = SpectrumScale(n);
     if (const ErrorCode failed = FFTRealForward(plan.get(), x, h, 1, 1, n))
         return failed;
-    x[0] = (h[0] * h[0]) * s;
-    const std::ptrdiff_t last = (n - 1) / 2;
-    std::ptrdiff_t k = 1;
-    for (; k + 2 * nativeLanes - 1 <= last; k += 2 * nativeLanes) {
-        PowerPairs<Lanes<nativeLanes>>(h, k, n, s, x);
-        PowerPairs<Lanes<nativeLanes>>(h, k + nativeLanes, n, s, x);
-    }
-    for (; k <= last; ++k)
-        PowerPairs<Lanes<1>>(h, k, n, s, x);
-    if (n % 2 == 0)
-        x[n / 2] = s * (h[n / 2] * h[n / 2]);
+    PowerOfHalfComplex(h, n, SpectrumScale(n), x);
     return work.release();
 }
 
@@ -71,9 +49,7 @@ ErrorCode PowerSpectrumComplex(const DBL *z, DBL *out, int32_t n) {
     DBL *const f = work.data();
     if (const ErrorCode failed = FFTComplexForward(plan.get(), z, z + 1, f, f + 1, 2, 2, n))
         return failed;
-    const double s = SpectrumScale(n);
-    for (std::ptrdiff_t k = 0; k < n; ++k)
-        out[k] = (f[2 * k] * f[2 * k] + f[2 * k + 1] * f[2 * k + 1]) * s;
+    PowerOfComplex(f, n, SpectrumScale(n), out);
     return work.release();
 }
 
@@ -143,15 +119,7 @@ ErrorCode CrossSpectrumComplex(const DBL *x, const DBL *y, int32_t n, DBL *out) 
     if (const ErrorCode failed =
             FFTComplexForward(plan.get(), y, y + 1, second, second + 1, 2, 2, n))
         return failed;
-    const double s = SpectrumScale(n);
-    for (std::ptrdiff_t k = 0; k < n; ++k) {
-        const double xRe = first[2 * k];
-        const double xIm = first[2 * k + 1];
-        const double yRe = second[2 * k];
-        const double yIm = second[2 * k + 1];
-        out[2 * k] = (xRe * yRe + yIm * xIm) * s;
-        out[2 * k + 1] = (xRe * yIm - yRe * xIm) * s;
-    }
+    CrossOfComplex(first, second, n, SpectrumScale(n), out);
     return work.release();
 }
 
