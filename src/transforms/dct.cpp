@@ -16,8 +16,8 @@ typedef Lanes<2> Pair;
 // Below, (c, s) stands for cos and sin of pi k / (2n); those of n - k are (s, c), so bins k and
 // n - k share one pair.
 
-// `Length` is the type of n: an integer, or one of fixed value, for which the compiler unrolls the
-// loops and computes the scale.
+// `Length` is the type of n: an integer, or one of fixed value that is transformed whole, for which
+// the compiler unrolls the loops and computes the scale.
 template <class Length>
 ErrorCode ForwardEven(const FFTPlan *plan, const DBL *x, std::ptrdiff_t inStride, DBL *out,
                       std::ptrdiff_t outStride, Length n, DBL *work) {
@@ -29,7 +29,9 @@ ErrorCode ForwardEven(const FFTPlan *plan, const DBL *x, std::ptrdiff_t inStride
         reordered[j] = x[2 * j * inStride];
         reordered[n - 1 - j] = x[(2 * j + 1) * inStride];
     }
-    if (const ErrorCode failed = FFTRealForward(plan, reordered, h, 1, 1, n))
+    if constexpr (!std::is_same_v<Length, int32_t>)
+        plan->whole.real(reordered, h);
+    else if (const ErrorCode failed = FFTRealForward(plan, reordered, h, 1, 1, n))
         return failed;
     const DBL *const wave = QuarterWave(plan);
     if (!wave)
