@@ -1,7 +1,8 @@
 #!/usr/bin/python3
 """Writes the straight-line transforms of the radices: one file kernels_<p>.cpp per radix, one for
 each of a few small lengths that are transformed whole, and kernels_choice.cpp. Beside a complex
-transform stands the real one of twice its length that is made of it.
+transform stands the real one of twice its length that is made of it, and with the odd primes from 11
+a table for their single transforms (whole.h).
 
     generate.py FOLDER
 
@@ -420,8 +421,10 @@ def file_of(p):
         texts.append(f"template <>\nconst KernelSet *KernelsFor<{p}>() {{\n"
                      f"    static constexpr KernelSet kernels = MakeKernels<{p}>();\n"
                      "    return &kernels;\n}\n")
-    for part in ["Complex"] if by_half else ["Complex", "Real"]:
-        texts.append(side_by_side(part, p, f"Whole{part}Transform<{p}>(in, out);"))
+    if p % 2 and p >= 11 and p not in SPLIT:
+        texts.append(prime_turns(p))
+    texts += [side_by_side(part, p, f"Whole{part}Transform<{p}>(in, out);")
+              for part in (["Complex"] if by_half else ["Complex", "Real"])]
     if 2 * p in BY_HALF:
         turns = [part(k, 2 * p) / 2 for k in range(1, (p + 1) // 2) for part in (cos_turn, sin_turn)]
         texts.append(side_by_side("Real", 2 * p,
@@ -429,6 +432,15 @@ def file_of(p):
                                   f"{{{', '.join(repr(float(x)) for x in turns)}}};\n"
                                   f"    RealByHalf<{2 * p}>(in, out, turns);"))
     return enclosed(f"The kernels of {p}", texts)
+
+
+def prime_turns(p):
+    half = p // 2
+    rows = [f"{float(value)!r}" for j in range(1, half + 1)
+            for k in range(1, half + half % 2 + 1)
+            for value in (cos_turn(j * k, p), -sin_turn(j * k, p))]
+    return (f"template <>\nstruct PrimeTurns<{p}> {{\n"
+            f"    static constexpr double rows[] = {{{', '.join(rows)}}};\n}};\n")
 
 
 def side_by_side(part, n, body):

@@ -7,20 +7,175 @@
 
 namespace qx::QX_WIDTH {
 
+// ---- Primes ----
+//
+// One transform of an odd prime leaves no columns for the lanes, so they run over the frequencies.
+// The arithmetic is that of the straight-line transform: mirrored values are summed and subtracted,
+// and X[k] and X[P-k] are made of the same two sums over them, in ascending order.
+
+constexpr bool runsOverFrequencies(int p) { return p >= 11 && p % 2 != 0 && p != 15; }
+
+// For j from 1 to P / 2, a row of cos and -sin of 2 pi j k / P for k from 1, an even number of
+// pairs.
+template <int P>
+struct PrimeTurns;
+
+template <int P>
+constexpr int primeRow = 2 * ((P / 2 + 1) / 2 * 2);
+// The registers that hold all frequencies, and how many accumulate at a time.
+template <int P>
+constexpr int primeWides = (P / 2 + packedColumns - 1) / packedColumns;
+template <int P, int Most>
+constexpr int primeBlock = (primeWides<P> + (primeWides<P> + Most - 1) / Most - 1) /
+                           ((primeWides<P> + Most - 1) / Most);
+
+QX_INLINE Wide InEveryPair(One x) {
+#ifdef __AVX2__
+    return Wide(__builtin_shufflevector(x.v, x.v, 0, 1, 0, 1));
+#else
+    return x;
+#endif
+}
+QX_INLINE Wide FirstsTwice(Wide x) {
+#ifdef __AVX2__
+    return Wide(__builtin_shufflevector(x.v, x.v, 0, 0, 2, 2));
+#else
+    return Wide(__builtin_shufflevector(x.v, x.v, 0, 0));
+#endif
+}
+QX_INLINE Wide SecondsTwice(Wide x) {
+#ifdef __AVX2__
+    return Wide(__builtin_shufflevector(x.v, x.v, 1, 1, 3, 3));
+#else
+    return Wide(__builtin_shufflevector(x.v, x.v, 1, 1));
+#endif
+}
+
+// The frequencies of the registers First to First + Count - 1, out of `start` and the pairs (sum,
+// difference) of mirrored values.
+template <int P, int First, int Count>
+QX_INLINE void RealPrimeBlock(One start, const One *mirrored, DBL *h) {
+    Wide value[Count];
+    for (int i = 0; i < Count; ++i)
+        value[i] = InEveryPair(start);
+    for (int j = 0; j < P / 2; ++j) {
+        const double *const turns = PrimeTurns<P>::rows + j * primeRow<P> + First * nativeLanes;
+        const Wide pair = InEveryPair(mirrored[j]);
+        for (int i = 0; i < Count; ++i)
+            value[i] = value[i] + pair * Wide::load(turns + i * nativeLanes);
+    }
+    for (int i = 0; i < Count * packedColumns; ++i) {
+        const int k = First * packedColumns + i + 1;
+        if (k > P / 2)
+            break;
+        h[k] = value[i / packedColumns][2 * (i % packedColumns)];
+        h[P - k] = value[i / packedColumns][2 * (i % packedColumns) + 1];
+    }
+}
+
+template <int P>
+QX_INLINE void RealPrime(const DBL *x, DBL *h) {
+    One mirrored[P / 2];
+    double total = x[0];
+    for (int j = 0; j < P / 2; ++j) {
+        const double left = x[j + 1];
+        const double right = x[P - 1 - j];
+        mirrored[j] = One(One::Vector{left + right, left - right});
+        total = total + (left + right);
+    }
+    h[0] = total;
+    const One start(One::Vector{x[0], 0.0});
+    constexpr int block = primeBlock<P, 8>;
+    constexpr int rest = primeWides<P> % block;
+    if constexpr (primeWides<P> >= block)
+        RealPrimeBlock<P, 0, block>(start, mirrored, h);
+    if constexpr (primeWides<P> >= 2 * block)
+        RealPrimeBlock<P, block, block>(start, mirrored, h);
+    if constexpr (primeWides<P> >= 3 * block)
+        RealPrimeBlock<P, 2 * block, block>(start, mirrored, h);
+    if constexpr (rest != 0)
+        RealPrimeBlock<P, primeWides<P> - rest, rest>(start, mirrored, h);
+}
+
+// The same of complex values: sums and i times the differences apart.
+template <int P, int First, int Count>
+QX_INLINE void ComplexPrimeBlock(One start, const One *sums, const One *differences, DBL *y) {
+    Wide even[Count], odd[Count];
+    for (int i = 0; i < Count; ++i) {
+        even[i] = InEveryPair(start);
+        odd[i] = Wide(0.0);
+    }
+    for (int j = 0; j < P / 2; ++j) {
+        const double *const turns = PrimeTurns<P>::rows + j * primeRow<P> + First * nativeLanes;
+        const Wide sum = InEveryPair(sums[j]);
+        const Wide difference = InEveryPair(differences[j]);
+        for (int i = 0; i < Count; ++i) {
+            const Wide turn = Wide::load(turns + i * nativeLanes);
+            even[i] = even[i] + sum * FirstsTwice(turn);
+            odd[i] = odd[i] + difference * SecondsTwice(turn);
+        }
+    }
+    for (int i = 0; i < Count; ++i) {
+        const Wide direct = even[i] + odd[i];
+        const Wide mirrored = even[i] - odd[i];
+        for (int column = 0; column < packedColumns; ++column) {
+            const int k = (First + i) * packedColumns + column + 1;
+            if (k > P / 2)
+                break;
+            y[2 * k] = direct[2 * column];
+            y[2 * k + 1] = direct[2 * column + 1];
+            y[2 * (P - k)] = mirrored[2 * column];
+            y[2 * (P - k) + 1] = mirrored[2 * column + 1];
+        }
+    }
+}
+
+template <int P>
+QX_INLINE void ComplexPrime(const DBL *x, DBL *y) {
+    One sums[P / 2], differences[P / 2];
+    const One start = One::load(x);
+    One total = start;
+    for (int j = 0; j < P / 2; ++j) {
+        const One left = One::load(x + 2 * (j + 1));
+        const One right = One::load(x + 2 * (P - 1 - j));
+        sums[j] = left + right;
+        differences[j] = TimesI(left - right);
+        total = total + sums[j];
+    }
+    total.store(y);
+    constexpr int block = primeBlock<P, 5>;
+    constexpr int rest = primeWides<P> % block;
+    if constexpr (primeWides<P> >= block)
+        ComplexPrimeBlock<P, 0, block>(start, sums, differences, y);
+    if constexpr (primeWides<P> >= 2 * block)
+        ComplexPrimeBlock<P, block, block>(start, sums, differences, y);
+    if constexpr (primeWides<P> >= 3 * block)
+        ComplexPrimeBlock<P, 2 * block, block>(start, sums, differences, y);
+    if constexpr (primeWides<P> >= 4 * block)
+        ComplexPrimeBlock<P, 3 * block, block>(start, sums, differences, y);
+    if constexpr (primeWides<P> >= 5 * block)
+        ComplexPrimeBlock<P, 4 * block, block>(start, sums, differences, y);
+    if constexpr (rest != 0)
+        ComplexPrimeBlock<P, primeWides<P> - rest, rest>(start, sums, differences, y);
+}
+
+// ---- Other lengths ----
+
 template <int P>
 QX_INLINE void WholeComplexTransform(const DBL *in, DBL *out) {
-    RunPacked<P, One>(SideBySideIn{in}, SideBySideOut{out});
+    if constexpr (runsOverFrequencies(P))
+        ComplexPrime<P>(in, out);
+    else
+        RunPacked<P, One>(SideBySideIn{in}, SideBySideOut{out});
 }
 
 template <int P>
 QX_INLINE void WholeRealTransform(const DBL *in, DBL *out) {
-    RunReal<P, Narrow>(RealColumnIn{in, 1}, RealColumnOut{out, 1});
+    if constexpr (runsOverFrequencies(P))
+        RealPrime<P>(in, out);
+    else
+        RunReal<P, Narrow>(RealColumnIn{in, 1}, RealColumnOut{out, 1});
 }
-
-struct ArrayOut {
-    One *y;
-    QX_INLINE void set(int k, One x) const { y[k] = x; }
-};
 
 // A real transform of P = 2 m values as a complex one of m: the values of even index are its real
 // parts, those of odd index its imaginary ones. With Z its spectrum, those of the even and of the
@@ -34,14 +189,14 @@ QX_INLINE void RealByHalf(const DBL *in, DBL *h, const double *turns) {
     const Bits imaginarySign = {0, INT64_MIN};
     const auto conjugate = [=](One x) { return One((One::Vector)((Bits)x.v ^ imaginarySign)); };
 
-    One z[m];
-    RunPacked<m, One>(SideBySideIn{in}, ArrayOut{z});
-    h[0] = z[0][0] + z[0][1];
-    h[m] = z[0][0] - z[0][1];
+    double z[P];
+    WholeComplexTransform<m>(in, z);
+    h[0] = z[0] + z[1];
+    h[m] = z[0] - z[1];
 #pragma GCC unroll 16
     for (int k = 1; 2 * k < m; ++k) {
-        const One low = z[k];
-        const One high = conjugate(z[m - k]);
+        const One low = One::load(z + 2 * k);
+        const One high = conjugate(One::load(z + 2 * (m - k)));
         const One even = (low + high) * One(0.5);
         const One odd = Turned(low - high, -turns[2 * k - 1], turns[2 * k - 2]);
         const One direct = even + odd;
@@ -52,8 +207,8 @@ QX_INLINE void RealByHalf(const DBL *in, DBL *h, const double *turns) {
         h[m + k] = mirrored[1];
     }
     if constexpr (m % 2 == 0) {
-        h[m / 2] = z[m / 2][0];
-        h[m + m / 2] = -z[m / 2][1];
+        h[m / 2] = z[m];
+        h[m + m / 2] = -z[m + 1];
     }
 }
 
