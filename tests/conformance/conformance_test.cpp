@@ -8,6 +8,7 @@
 #include <algorithm>
 #include <cctype>
 #include <fstream>
+#include <map>
 #include <set>
 #include <string>
 #include <thread>
@@ -41,7 +42,9 @@ protected:
         const ErrorCode status = call.status(result);
         if (call.hasErr()) {
             const bool isRefusal = refusal != 0 && has(HostStatusInResult);
-            EXPECT_EQ(result, isRefusal ? refusal : has(CodeInBoth) ? status : 0)
+            EXPECT_EQ(result, isRefusal         ? refusal
+                              : has(CodeInBoth) ? status
+                                                : 0)
                 << "the function result beside *err";
         }
         expectDocumented(status, refusal);
@@ -243,6 +246,29 @@ std::string TestName(const testing::TestParamInfo<Recipe> &info) {
     return name;
 }
 INSTANTIATE_TEST_SUITE_P(Exports, Conformance, testing::ValuesIn(AllRecipes()), TestName);
+
+// Any bit that changes shows as a changed line in the review of tests/conformance/hashes.txt.
+TEST(Hashes, AreThoseThatWereAccepted) {
+    std::map<std::string, std::string> accepted;
+    std::ifstream file(QX_HASHES);
+    for (std::string name, hash; file >> name >> hash;)
+        EXPECT_TRUE(accepted.emplace(name, hash).second) << name << " stands twice";
+    std::string changed;
+    for (const auto &[name, found] : HashEveryExport()) {
+        if (found.mayDiffer)
+            continue;
+        char hash[17];
+        std::snprintf(hash, sizeof hash, "%016llx", static_cast<unsigned long long>(found.hash));
+        const auto known = accepted.find(name);
+        if (known == accepted.end() || known->second != hash)
+            changed += "\n" + name + (known == accepted.end() ? " is new" : " has changed");
+        accepted.erase(name);
+    }
+    for (const auto &gone : accepted)
+        changed += "\n" + gone.first + " is gone";
+    EXPECT_EQ(changed, "")
+        << "If that is meant: tools/compare_hashes --accept, and commit " QX_HASHES;
+}
 
 TEST(Catalogue, EveryExportHasARecipe) {
     std::set<std::string> recipes, known;

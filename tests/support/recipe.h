@@ -15,6 +15,8 @@
 // One line per export that says how it is called with valid arguments. From these lines the
 // conformance tests drive every export through failing resizes and allocations, empty and
 // mismatched inputs, the workspace, moving blocks and several threads, and the bit hashes are made.
+// The hashes of all exports are committed (tests/conformance/hashes.txt): whoever adds an export or
+// a recipe, or changes a bit on purpose, runs tools/compare_hashes --accept and commits its lines.
 //
 //   {"ReOXFFTH80", [](Call &c) {
 //        return ReOXFFTH80(c.in<DBL>(0), c.out<CDB>(0), c.slot(0), 1, c.n, 0);

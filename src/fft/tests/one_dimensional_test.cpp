@@ -330,43 +330,6 @@ TEST(OneDimensional, InstanceDataIsSharedReleasedAndNeverSwept) {
     EXPECT_EQ(TransformUnreserveProc(&second), 0);
 }
 
-// A heap that fails at each allocation in turn: a code, an empty output, and nothing leaked once
-// the node is cleaned up.
-TEST(OneDimensional, EveryFailedAllocationEndsCleanly) {
-    if (!HeapProbe::works())
-        GTEST_SKIP();
-    const DBLArray real(RandomSignal(9));
-    const CDBArray complex(RandomComplex(9));
-    const auto run = [&](bool isReal, bool isInstance, Node &node, CDBArray &out) {
-        if (isInstance)
-            return isReal
-                       ? ReOXFFTH80_IDP(real.handle(), out.handle(), &node.instance, 4, 10, 1)
-                       : CxOXFFTH80_IDP(complex.handle(), out.handle(), &node.instance, 4, 10, 1);
-        return isReal ? ReOXFFTH80(real.handle(), out.handle(), &node.slot, 4, 10, 1)
-                      : CxOXFFTH80(complex.handle(), out.handle(), &node.slot, 4, 10, 1);
-    };
-    for (bool isReal : {false, true})
-        for (bool isInstance : {false, true}) {
-            int32_t failAt = 1;
-            for (bool failed = true; failed; ++failAt) {
-                CDBArray out(1);
-                const HeapProbe probe(failAt);
-                {
-                    Node node;
-                    ErrorCode status = run(isReal, isInstance, node, out);
-                    failed = probe.allocations() >= failAt;
-                    // An engine that can do without some table goes on.
-                    const bool refused = status != 0;
-                    EXPECT_LE(refused, failed);
-                    EXPECT_EQ(status, refused ? ErrOutOfMemory : 0);
-                    EXPECT_EQ(out.size(), refused ? 0 : 10);
-                }
-                EXPECT_EQ(probe.liveAllocations(), 0) << failAt;
-            }
-            EXPECT_GT(failAt, 4);
-        }
-}
-
 // What a node does call after call, in real time too: with its plan held and the workspace serving,
 // no export turns to the heap, whatever its length, window and order.
 TEST(OneDimensional, AHeldPlanNeedsNoHeap) {

@@ -1,7 +1,6 @@
 #include "fft/plan_slot.h"
 #include "qx/errors.h"
 #include "qx/fft.h"
-#include "tests/support/heap_probe.h"
 #include "tests/support/hostile_host.h"
 #include "tests/support/transform_reference.h"
 
@@ -14,7 +13,6 @@ namespace {
 using qx::test::CDBMatrix;
 using qx::test::DBLMatrix;
 using qx::test::Dft;
-using qx::test::HeapProbe;
 using qx::test::Host;
 using qx::test::LongSpectrum;
 using qx::test::MaxError;
@@ -212,46 +210,6 @@ TEST(TwoDimensional, AHostThatRefusesIsQuotedWithThePlansKept) {
             return ReInvFFT2D_H_IDP(complex.handle(), 0, realOut.handle(), &node.instance);
         });
     }
-}
-
-TEST(TwoDimensional, EveryFailedAllocationEndsCleanly) {
-    if (!HeapProbe::works())
-        GTEST_SKIP();
-    DBLMatrix real(3, 4);
-    CDBMatrix complex(3, 4);
-    Fill(real);
-    Fill(complex);
-    const auto forward = [&](Node &node, CDBMatrix &out) {
-        return CxFFT2D_H(complex.handle(), 1, 1, 4, 5, 1, out.handle(), &node.slot, &node.second);
-    };
-    const auto realForward = [&](Node &node, CDBMatrix &out) {
-        return ReFFT2D_H_IDP(real.handle(), 1, 1, 4, 5, 1, out.handle(), &node.instance);
-    };
-    const auto inverse = [&](Node &node, CDBMatrix &out) {
-        return CxInvFFT2D_H(complex.handle(), 1, out.handle(), &node.slot, &node.second);
-    };
-    const auto failEach = [](auto run) {
-        int32_t failAt = 1;
-        for (bool failed = true; failed; ++failAt) {
-            CDBMatrix out(1, 1);
-            const HeapProbe probe(failAt);
-            {
-                Node node;
-                ErrorCode status = run(node, out);
-                failed = probe.allocations() >= failAt;
-                // An engine that can do without some table goes on.
-                const bool refused = status != 0;
-                EXPECT_LE(refused, failed);
-                EXPECT_EQ(status, refused ? ErrOutOfMemory : 0);
-                EXPECT_EQ(out.rows() == 0, refused);
-            }
-            EXPECT_EQ(probe.liveAllocations(), 0) << failAt;
-        }
-        EXPECT_GT(failAt, 6);
-    };
-    failEach(forward);
-    failEach(realForward);
-    failEach(inverse);
 }
 
 TEST(TwoDimensional, RequestsBeyondMemoryEndInACode) {

@@ -2,7 +2,6 @@
 #include "qx/errors.h"
 #include "qx/spectra.h"
 #include "spectra/power_spectrum.h"
-#include "tests/support/heap_probe.h"
 #include "tests/support/hostile_host.h"
 #include "tests/support/transform_reference.h"
 
@@ -15,7 +14,6 @@ namespace {
 using qx::test::CDBArray;
 using qx::test::DBLArray;
 using qx::test::Dft;
-using qx::test::HeapProbe;
 using qx::test::Host;
 using qx::test::Long;
 using qx::test::LongSpectrum;
@@ -198,58 +196,6 @@ TEST(Spectra, EachExportTreatsARefusalInItsWay) {
         EXPECT_EQ(complexCross.size(), 0);
         ResetHost();
     }
-}
-
-TEST(Spectra, EveryFailedAllocationEndsCleanly) {
-    if (!HeapProbe::works())
-        GTEST_SKIP();
-    const Signal values = RandomSignal(6);
-    const DBLArray y(values);
-    const CDBArray z(RandomComplex(6));
-    const auto failEach = [](auto run) {
-        int32_t failAt = 1;
-        for (bool failed = true; failed; ++failAt) {
-            const HeapProbe probe(failAt);
-            {
-                Node node;
-                int32_t size = 0;
-                ErrorCode status = run(node, size);
-                failed = probe.allocations() >= failAt;
-                // An engine that can do without some table goes on.
-                const bool refused = status != 0;
-                EXPECT_LE(refused, failed);
-                EXPECT_EQ(status, refused ? ErrOutOfMemory : 0);
-                EXPECT_EQ(size, refused ? 0 : 6);
-            }
-            EXPECT_EQ(probe.liveAllocations(), 0) << failAt;
-        }
-        EXPECT_GT(failAt, 2);
-    };
-    failEach([&](Node &node, int32_t &size) {
-        const DBLArray x(values);
-        const ErrorCode status = SpectrumH(x.handle(), &node.slot);
-        size = x.size();
-        return status;
-    });
-    failEach([&](Node &node, int32_t &size) {
-        DBLArray out;
-        const ErrorCode status = CxSpectrumH_IDP(z.handle(), out.handle(), &node.instance);
-        size = out.size();
-        return status;
-    });
-    failEach([&](Node &node, int32_t &size) {
-        CDBArray out;
-        const ErrorCode status = CrossSpectrumH(y.handle(), y.handle(), out.handle(), &node.slot);
-        size = out.size();
-        return status;
-    });
-    failEach([&](Node &node, int32_t &size) {
-        CDBArray out;
-        const ErrorCode status =
-            CxCrossSpectrumH_IDP(z.handle(), z.handle(), out.handle(), &node.instance);
-        size = out.size();
-        return status;
-    });
 }
 
 TEST(Spectra, TheSlotFollowsTheLength) {
