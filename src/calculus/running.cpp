@@ -73,11 +73,10 @@ template <int32_t Width, class Panel>
 void ChainPanels(const DBL *x, int32_t n, const double *first, double factor, DBL *out,
                  const Panel &panel) {
     double window[Width + 1];
-    for (int32_t k = 0; k <= Width; ++k)
+    for (int32_t k = 0; k < Width; ++k)
         window[k] = first[k];
     for (int32_t i = Width; i < n; ++i) {
-        // The sample at Width has been saved as well, so nothing written is read.
-        window[Width] = i == Width ? first[Width] : static_cast<double>(x[i]);
+        window[Width] = x[i];
         out[i] = out[i - Width] + panel(window) * factor;
         for (int32_t k = 0; k < Width; ++k)
             window[k] = window[k + 1];

@@ -75,6 +75,7 @@ TEST(Interpolation, PolynomialIsLagranges) {
     const Value parabola = At(PolyInterp_head, {0, 1, 2}, {0, 1, 4}, 0.25);
     EXPECT_EQ(parabola.yi, 0.0625);
     EXPECT_EQ(parabola.dy, 0.0625 - 0.25);
+    EXPECT_NEAR(At(PolyInterp_head, {0, 1, 2}, {0, 1, 4}, 0.9).dy, 0.81 - 0.9, 1e-15);
 }
 
 TEST(Interpolation, RationalFollowsRationals) {

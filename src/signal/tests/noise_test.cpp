@@ -204,6 +204,69 @@ TEST(Noises, GaussIsThePolarMethod) {
     }
 }
 
+// The rejections as they are told, from the numbers of the one sequence in long double: they decide
+// which numbers are used, so a factor that is off by little leaves the stream.
+TEST(Noises, RejectionsUseTheNumbersAsTold) {
+    typedef long double Long;
+    const auto tangent = [](OneSequence &u) { return std::tan(M_PIl * u.next()); };
+    RandomState state = start;
+    OneSequence u(start);
+    for (const double value : Poisson(3000, 40.0, -1, state)) {
+        const Long mean = 40;
+        Long y = 0;
+        Long v = 0;
+        do {
+            do {
+                y = tangent(u);
+                v = std::sqrt(2 * mean) * y + mean;
+            } while (v < 0);
+            v = std::floor(v);
+        } while (u.next() > 0.9L * (1 + y * y) *
+                                std::exp((v - mean) * std::log(mean) - std::lgamma(v + 1) +
+                                         std::lgamma(mean + 1)));
+        ASSERT_EQ(value, static_cast<double>(v));
+    }
+    state = start;
+    u = OneSequence(start);
+    BinomialCache cache = {};
+    for (const double value : Binomial(3000, 100, 0.7, -1, state, cache)) {
+        const Long q = 1 - Long{0.7};
+        Long y = 0;
+        Long v = 0;
+        const Long width = std::sqrt(200 * q * (1 - q));
+        do {
+            do {
+                y = tangent(u);
+                v = width * y + 100 * q;
+            } while (v < 0 || v >= 101);
+            v = std::floor(v);
+        } while (u.next() >
+                 1.2L * width * (1 + y * y) *
+                     std::exp(std::lgamma(101.0L) - std::lgamma(v + 1) - std::lgamma(101 - v) +
+                              v * std::log(q) + (100 - v) * std::log(1 - q)));
+        ASSERT_EQ(value, static_cast<double>(100 - v));
+    }
+    state = start;
+    u = OneSequence(start);
+    for (const double value : Gamma(3000, 9, -1, state)) {
+        Long y = 0;
+        Long v = 0;
+        do {
+            do {
+                Long a = 0;
+                Long b = 0;
+                do {
+                    a = 2 * u.next() - 1;
+                    b = 2 * u.next() - 1;
+                } while (a * a + b * b > 1);
+                y = b / a;
+                v = std::sqrt(17.0L) * y + 8;
+            } while (v <= 0);
+        } while (u.next() > (1 + y * y) * std::exp(8 * std::log(v / 8) - std::sqrt(17.0L) * y));
+        ASSERT_NEAR(value, static_cast<double>(v), 1e-9);
+    }
+}
+
 // Kolmogorov and Smirnov's statistic; above 1.95 with a probability of 0.001.
 double Discrepancy(Samples x, const std::function<double(double)> &distribution) {
     std::sort(x.begin(), x.end());

@@ -189,6 +189,14 @@ TEST(Waves, SquareClampsItsDuty) {
     }
 }
 
+TEST(Waves, WholeTurnsBackAreTheStart) {
+    DBLArray x;
+    double phase = 0.0;
+    Call(SquareWaveCIN, x, 16, -0.25, phase, &duty); // 0, 270, 180, 90
+    for (int32_t i = 0; i < 16; ++i)
+        EXPECT_EQ(x[i], i % 4 == 0 || i % 4 == 3 ? amp : -amp) << i;
+}
+
 TEST(Waves, TablesAreNeverReadOutside) {
     const int32_t one = 1;
     const DBLArray empty(0);

@@ -30,12 +30,13 @@ Outcome Riffle(Out<I32_1D> &indices, int32_t n, int32_t seed, RandomState *state
 template <class Array>
 Outcome RiffleArray(InOut<Array> x, Out<I32_1D> indices, int32_t seed, RandomState *state,
                     int32_t unbiased) {
-    return Riffle(indices, x.size(), seed, state, unbiased != 0,
-                  [elements = x.data()](int32_t i, int32_t j) {
-                      const auto held = elements[i];
-                      elements[i] = elements[j];
-                      elements[j] = held;
-                  });
+    // By its own type: a deduced one would forget that elements are unaligned.
+    typename HandleTraits<Array>::T *elements = x.data();
+    return Riffle(indices, x.size(), seed, state, unbiased != 0, [elements](int32_t i, int32_t j) {
+        const auto held = elements[i];
+        elements[i] = elements[j];
+        elements[j] = held;
+    });
 }
 
 Outcome RiffleNumbers(Out<I32_1D> indices, int32_t count, int32_t seed, RandomState *state,

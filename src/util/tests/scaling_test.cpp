@@ -255,6 +255,19 @@ TEST(Unwrapping, FollowsItsRuleToTheBit) {
             }
         }
     }
+    // Exactly half a turn goes down, in the lanes as well.
+    DBLArray halves(Samples(40, 0.0));
+    Samples expected(40, 0.0);
+    for (std::size_t i = 20; i < 40; i += 2) {
+        halves.data()[i] = 180.0;
+        expected[i] = -180.0;
+    }
+    for (std::size_t i = 21; i < 40; i += 2)
+        expected[i] = -360.0;
+    for (std::size_t i = 22; i < 40; ++i)
+        expected[i] = expected[i - 1] - 180.0;
+    EXPECT_EQ(unWrap85(halves.handle(), 2), 0);
+    EXPECT_EQ(halves.values(), expected);
     DBLArray pair{0.0, 3.2};
     ErrorCode err;
     unWrap(pair.handle(), &err);
