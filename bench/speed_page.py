@@ -12,7 +12,7 @@ HEAD = """# Speed
 
 Written by `bench/run --all`. Each row is a geometric mean of the ratios time of ours / time of the
 peer, one thread, plans and the like made outside the timed loop; below 1 is faster than the peer.
-Medians of interleaved runs.
+Medians of interleaved runs; on a machine with a load of its own (below) single worst cases say little.
 """
 
 
@@ -25,7 +25,8 @@ def machine():
                        if name + " cache" in facts)
     return (f"{facts['Model name'].strip()} (family {facts['CPU family'].strip()}, model "
             f"{facts['Model'].strip()}), {os.cpu_count()} processors, {caches}; "
-            f"{platform.system()} {platform.release()}, {datetime.date.today().isoformat()}")
+            f"{platform.system()} {platform.release()}, {datetime.date.today().isoformat()}, load "
+            f"average {os.getloadavg()[2]:.1f}")
 
 
 def main():
