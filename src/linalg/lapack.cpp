@@ -158,6 +158,133 @@ int32_t MoveInSchur(int32_t n, CDB *t, CDB *z, int32_t from, int32_t to) {
     return info;
 }
 
+int32_t GeneralisedSchur(int32_t n, DBL *s, DBL *t, CDB *alpha, DBL *beta, DBL *q, DBL *z) {
+    const BlasMemory memory;
+    AlignedScratch<ElementType::DBL> values, work;
+    if (!memory || values.allocate(3 * int64_t{n}) != 0)
+        return noMemory;
+    DBL size, *const re = values.data(), *const im = re + n, *const divisor = im + n;
+    int32_t info = 0, selected = 0, length = -1;
+    LAPACK_dgges("V", "V", "N", nullptr, &n, s, &n, t, &n, &selected, re, im, divisor, q, &n, z, &n,
+                 &size, &length, nullptr, &info);
+    length = Answer(&size);
+    if (work.allocate(length) != 0)
+        return noMemory;
+    LAPACK_dgges("V", "V", "N", nullptr, &n, s, &n, t, &n, &selected, re, im, divisor, q, &n, z, &n,
+                 work.data(), &length, nullptr, &info);
+    for (int32_t i = 0; i < n; ++i) {
+        alpha[i] = {re[i], im[i]};
+        beta[i] = divisor[i];
+    }
+    return info;
+}
+int32_t GeneralisedSchur(int32_t n, CDB *s, CDB *t, CDB *alpha, CDB *beta, CDB *q, CDB *z) {
+    const BlasMemory memory;
+    AlignedScratch<ElementType::CDB> values, work;
+    AlignedScratch<ElementType::DBL> real;
+    if (!memory || values.allocate(2 * int64_t{n}) != 0 || real.allocate(8 * int64_t{n}) != 0)
+        return noMemory;
+    CDB size, *const dividend = values.data(), *const divisor = dividend + n;
+    int32_t info = 0, selected = 0, length = -1;
+    LAPACK_zgges("V", "V", "N", nullptr, &n, s, &n, t, &n, &selected, dividend, divisor, q, &n, z,
+                 &n, &size, &length, real.data(), nullptr, &info);
+    length = Answer(&size);
+    if (work.allocate(length) != 0)
+        return noMemory;
+    LAPACK_zgges("V", "V", "N", nullptr, &n, s, &n, t, &n, &selected, dividend, divisor, q, &n, z,
+                 &n, work.data(), &length, real.data(), nullptr, &info);
+    for (int32_t i = 0; i < n; ++i) {
+        alpha[i] = dividend[i];
+        beta[i] = divisor[i];
+    }
+    return info;
+}
+
+int32_t MoveInGeneralisedSchur(int32_t n, DBL *s, DBL *t, DBL *q, DBL *z, int32_t from,
+                               int32_t to) {
+    const BlasMemory memory;
+    AlignedScratch<ElementType::DBL> work;
+    const int32_t length = 4 * n + 16, yes = 1;
+    if (!memory || work.allocate(length) != 0)
+        return noMemory;
+    int32_t info = 0, first = from + 1, last = to + 1;
+    LAPACK_dtgexc(&yes, &yes, &n, s, &n, t, &n, q, &n, z, &n, &first, &last, work.data(), &length,
+                  &info);
+    return info;
+}
+int32_t MoveInGeneralisedSchur(int32_t n, CDB *s, CDB *t, CDB *q, CDB *z, int32_t from,
+                               int32_t to) {
+    const BlasMemory memory;
+    if (!memory)
+        return noMemory;
+    const int32_t yes = 1, first = from + 1;
+    int32_t info = 0, last = to + 1;
+    LAPACK_ztgexc(&yes, &yes, &n, s, &n, t, &n, q, &n, z, &n, &first, &last, &info);
+    return info;
+}
+
+int32_t GeneralisedVectors(int32_t n, const DBL *s, const DBL *t, DBL *z) {
+    const BlasMemory memory;
+    AlignedScratch<ElementType::DBL> work;
+    if (!memory || work.allocate(6 * int64_t{n}) != 0)
+        return noMemory;
+    int32_t info = 0, found = 0;
+    LAPACK_dtgevc("R", "B", nullptr, &n, s, &n, t, &n, nullptr, &n, z, &n, &n, &found, work.data(),
+                  &info);
+    return info;
+}
+int32_t GeneralisedVectors(int32_t n, const CDB *s, const CDB *t, CDB *z) {
+    const BlasMemory memory;
+    AlignedScratch<ElementType::CDB> work;
+    AlignedScratch<ElementType::DBL> real;
+    if (!memory || work.allocate(2 * int64_t{n}) != 0 || real.allocate(2 * int64_t{n}) != 0)
+        return noMemory;
+    int32_t info = 0, found = 0;
+    LAPACK_ztgevc("R", "B", nullptr, &n, s, &n, t, &n, nullptr, &n, z, &n, &n, &found, work.data(),
+                  real.data(), &info);
+    return info;
+}
+
+int32_t GeneralisedSingular(int32_t m, int32_t n, int32_t p, DBL *a, DBL *b, SingularRanks *ranks,
+                            DBL *alpha, DBL *beta, DBL *u, DBL *v, DBL *q) {
+    const BlasMemory memory;
+    AlignedScratch<ElementType::I32> order;
+    AlignedScratch<ElementType::DBL> work;
+    if (!memory || order.allocate(n) != 0)
+        return noMemory;
+    DBL size;
+    int32_t info = 0, length = -1, k = 0, l = 0;
+    LAPACK_dggsvd3("U", "V", "Q", &m, &n, &p, &k, &l, a, &m, b, &p, alpha, beta, u, &m, v, &p, q,
+                   &n, &size, &length, order.data(), &info);
+    length = Answer(&size);
+    if (work.allocate(length) != 0)
+        return noMemory;
+    LAPACK_dggsvd3("U", "V", "Q", &m, &n, &p, &k, &l, a, &m, b, &p, alpha, beta, u, &m, v, &p, q,
+                   &n, work.data(), &length, order.data(), &info);
+    *ranks = {k, l};
+    return info;
+}
+int32_t GeneralisedSingular(int32_t m, int32_t n, int32_t p, CDB *a, CDB *b, SingularRanks *ranks,
+                            DBL *alpha, DBL *beta, CDB *u, CDB *v, CDB *q) {
+    const BlasMemory memory;
+    AlignedScratch<ElementType::I32> order;
+    AlignedScratch<ElementType::CDB> work;
+    AlignedScratch<ElementType::DBL> real;
+    if (!memory || order.allocate(n) != 0 || real.allocate(2 * int64_t{n}) != 0)
+        return noMemory;
+    CDB size;
+    int32_t info = 0, length = -1, k = 0, l = 0;
+    LAPACK_zggsvd3("U", "V", "Q", &m, &n, &p, &k, &l, a, &m, b, &p, alpha, beta, u, &m, v, &p, q,
+                   &n, &size, &length, real.data(), order.data(), &info);
+    length = Answer(&size);
+    if (work.allocate(length) != 0)
+        return noMemory;
+    LAPACK_zggsvd3("U", "V", "Q", &m, &n, &p, &k, &l, a, &m, b, &p, alpha, beta, u, &m, v, &p, q,
+                   &n, work.data(), &length, real.data(), order.data(), &info);
+    *ranks = {k, l};
+    return info;
+}
+
 } // namespace lapack
 
 } // namespace qx

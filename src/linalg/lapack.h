@@ -56,6 +56,26 @@ int32_t Schur(int32_t n, CDB *t, CDB *w, CDB *z);
 int32_t MoveInSchur(int32_t n, DBL *t, DBL *z, int32_t from, int32_t to);
 int32_t MoveInSchur(int32_t n, CDB *t, CDB *z, int32_t from, int32_t to);
 
+// Generalised Schur form of s and t, which become (quasi-)triangular: the eigenvalues are
+// alpha[i] / beta[i], and q and z the left and the right Schur vectors.
+int32_t GeneralisedSchur(int32_t n, DBL *s, DBL *t, CDB *alpha, DBL *beta, DBL *q, DBL *z);
+int32_t GeneralisedSchur(int32_t n, CDB *s, CDB *t, CDB *alpha, CDB *beta, CDB *q, CDB *z);
+int32_t MoveInGeneralisedSchur(int32_t n, DBL *s, DBL *t, DBL *q, DBL *z, int32_t from, int32_t to);
+int32_t MoveInGeneralisedSchur(int32_t n, CDB *s, CDB *t, CDB *q, CDB *z, int32_t from, int32_t to);
+// The right Schur vectors z become the right eigenvectors; those of a pair are the real and the
+// imaginary part of the first one's.
+int32_t GeneralisedVectors(int32_t n, const DBL *s, const DBL *t, DBL *z);
+int32_t GeneralisedVectors(int32_t n, const CDB *s, const CDB *t, CDB *z);
+
+// Generalised singular values of a (m by n) and b (p by n), as LAPACK's xGGSVD3 tells.
+struct SingularRanks {
+    int32_t k, l;
+};
+int32_t GeneralisedSingular(int32_t m, int32_t n, int32_t p, DBL *a, DBL *b, SingularRanks *ranks,
+                            DBL *alpha, DBL *beta, DBL *u, DBL *v, DBL *q);
+int32_t GeneralisedSingular(int32_t m, int32_t n, int32_t p, CDB *a, CDB *b, SingularRanks *ranks,
+                            DBL *alpha, DBL *beta, CDB *u, CDB *v, CDB *q);
+
 } // namespace lapack
 
 } // namespace qx

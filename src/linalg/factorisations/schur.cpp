@@ -2,6 +2,7 @@
 
 #include "frame/scratch.h"
 #include "linalg/aligned.h"
+#include "linalg/factorisations/block_order.h"
 #include "linalg/lapack.h"
 #include "linalg/matrix.h"
 #include "linalg/transpose.h"
@@ -10,17 +11,6 @@
 
 namespace qx {
 namespace {
-
-// LAPACK's info of a Schur form.
-ErrorCode CodeOfInfo(int32_t info, int32_t n) {
-    if (info < 0)
-        return lapack::CodeOf(info);
-    if (info == 0)
-        return 0;
-    if (info <= n)
-        return ErrIterationLimit;
-    return info == n + 1 ? ErrConditionTooHigh : ErrSolverCount;
-}
 
 template <ElementType E>
 class OrderedSchur {
@@ -38,16 +28,17 @@ public:
         withVectors_ = withVectors;
         CopyTransposed<E>(a, n_, n_, n_, form_.data(), n_);
         const int32_t info = lapack::Schur(n_, form_.data(), w, vectors());
-        if (const ErrorCode failed = CodeOfInfo(info, n_))
+        if (const ErrorCode failed = CodeOfSchur(info, n_))
             return failed;
         if (order == schurUnordered)
             return 0;
-        if (const ErrorCode failed = sizes_.allocate(n_))
-            return failed;
-        if (const ErrorCode failed = keys_.allocate(n_))
+        if (const ErrorCode failed = blocks_.allocate(n_))
             return failed;
         classify(order, w);
-        if (const ErrorCode failed = sort())
+        const auto move = [this](int32_t from, int32_t to) {
+            return lapack::MoveInSchur(n_, form_.data(), vectors(), from, to);
+        };
+        if (const ErrorCode failed = blocks_.sort(move))
             return failed;
         readValues(w);
         return 0;
@@ -66,7 +57,6 @@ private:
     // The blocks along the diagonal, each with the key by which they ascend.
     void classify(int32_t order, CDB *w) {
         const double tiny = epsilon * sumOf(w);
-        blocks_ = 0;
         for (int32_t i = 0; i < n_;) {
             const bool isPair = E == ElementType::DBL && w[i].im != 0.0 && i + 1 < n_;
             if (isPair && std::fabs(w[i].im / w[i].re) <= n_ * epsilon &&
@@ -75,12 +65,9 @@ private:
                 w[i].im = w[i + 1].im = 0.0;
                 continue;
             }
-            const bool byModulus = order >= schurModulusAscending;
-            const double key = byModulus ? Modulus(w[i]) : w[i].re;
-            const bool descends = order == schurRealDescending || order == schurModulusDescending;
-            keys_[blocks_] = descends ? -key : key;
-            sizes_[blocks_] = isPair ? 2 : 1;
-            i += sizes_[blocks_++];
+            const int32_t size = isPair ? 2 : 1;
+            blocks_.add(w[i].re, Modulus(w[i]), size, order);
+            i += size;
         }
     }
     double sumOf(const CDB *w) const {
@@ -88,28 +75,6 @@ private:
         for (int32_t i = 0; i < n_; ++i)
             sum += AbsSum(w[i]);
         return sum;
-    }
-
-    // Bubble sort, in which an exchange moves a block up. Blocks that LAPACK finds too close to
-    // tell apart stay as they are.
-    ErrorCode sort() {
-        for (int32_t pass = 1; pass < blocks_; ++pass) {
-            int32_t row = 0;
-            for (int32_t k = 0; k + 1 <= blocks_ - pass; ++k) {
-                if (keys_[k + 1] < keys_[k]) {
-                    const int32_t info =
-                        lapack::MoveInSchur(n_, form_.data(), vectors(), row + sizes_[k], row);
-                    if (info < 0)
-                        return lapack::CodeOf(info);
-                    if (info == 0) {
-                        Swap(&keys_[k], &keys_[k + 1]);
-                        Swap(&sizes_[k], &sizes_[k + 1]);
-                    }
-                }
-                row += sizes_[k];
-            }
-        }
-        return 0;
     }
 
     void readValues(CDB *w) const {
@@ -125,11 +90,10 @@ private:
         }
     }
 
-    int32_t n_, blocks_ = 0;
+    int32_t n_;
     bool withVectors_ = false;
     AlignedScratch<E> form_, vectors_;
-    Scratch<ElementType::DBL> keys_;
-    Scratch<ElementType::I32> sizes_;
+    BlockOrder blocks_;
 };
 
 template <ElementType E>
