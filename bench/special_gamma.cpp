@@ -4,7 +4,7 @@
 #include "special/digamma.h"
 #include "special/factorial.h"
 #include "stats/distributions.h"
-#include "stats/gamma.h"
+#include "special/gamma.h"
 
 #include <cmath>
 

@@ -1,10 +1,10 @@
 /* The whole road of a call: make an array, call an export, read the result, and show the text of
    a failure. The module finds the stand-in host by itself, because this program is linked to it.
 
-       cc -std=c11 -Iinclude examples/first_call.c -Lbuild/release -lqxrt -lqxanalysis */
+       cc -std=c11 -Iinclude -Ibuild/release/include examples/first_call.c -Lbuild/release -lqxrt -lqxanalysis */
 
 #include "qx/host.h"
-#include "qx/stats.h"
+#include "qx/qx.h"
 
 #include <stdio.h>
 

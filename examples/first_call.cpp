@@ -2,7 +2,7 @@
 // failure is an exception.
 
 #include "qx/host.hpp"
-#include "qx/stats.h"
+#include "qx/qx.h"
 
 #include <cstdio>
 

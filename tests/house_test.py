@@ -22,6 +22,24 @@ class House(unittest.TestCase):
         self.assertIn("src/frame/export.h:4", lines_that(r"^#include", SOURCES), "a rule finds")
         self.assertEqual(lines_that(r"\busing\s+namespace\b", SOURCES), [])
 
+    def test_no_guard_serves_two_headers(self):
+        guards = {}
+        for path in SOURCES:
+            if guard := re.match(r"#ifndef (\w+)\n", path.read_text("utf-8")):
+                self.assertNotIn(guard[1], guards, path)
+                guards[guard[1]] = path
+
+    def test_a_topic_has_one_name(self):
+        """Header, exports, test and recipe of a topic carry the same name."""
+        topics = sorted((ROOT / "src").glob("*/exports/*.cpp"))
+        self.assertTrue(topics)
+        for exports in topics:
+            family, topic = exports.parent.parent, exports.stem
+            for path in (ROOT / f"include/qx/{topic}.h", family / f"tests/{topic}_test.cpp",
+                         family / f"recipes/{topic}.cpp"):
+                self.assertTrue(path.exists(), f"{path.relative_to(ROOT)} belongs to"
+                                f" {exports.relative_to(ROOT)}")
+
 
 if __name__ == "__main__":
     unittest.main()

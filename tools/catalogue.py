@@ -5,6 +5,7 @@
     catalogue.py INCLUDE_DIR --map FILE       linker version script of exactly the exports
     catalogue.py INCLUDE_DIR --def FILE       module definition file of exactly the exports
     catalogue.py INCLUDE_DIR --codes FILE     an export with a status a line, and its codes
+    catalogue.py INCLUDE_DIR --umbrella FILE  qx/qx.h, which includes all headers
 
 The headers are the one place where an export is declared. A declaration that cannot be read, an
 export without documentation, a name declared twice, an export with a status but without codes and
@@ -27,7 +28,7 @@ import re
 import sys
 from pathlib import Path
 
-NOT_A_FAMILY = {"types.h", "errors.h", "host.h", "qx.h"}
+NOT_A_FAMILY = {"types.h", "errors.h", "host.h"}
 
 # C type of a scalar -> element name.
 SCALARS = {
@@ -405,24 +406,12 @@ def codes_of(path):
     return {name: int(number) for name, number in pairs}
 
 
-def headers_of(folder, name):
-    """The headers that a header includes, by any number of steps."""
-    found, left = set(), [name]
-    while left:
-        path = folder / left.pop()
-        if path.name not in found and path.exists():
-            found.add(path.name)
-            left += re.findall(r'#include "qx/([^"]+)"', path.read_text("utf-8"))
-    return found
-
-
 def read_headers(include):
     """The whole catalogue; `include` is the folder that holds qx/."""
     folder = Path(include) / "qx"
     codes = codes_of(folder / "errors.h")
     types, exports, seen = Types(), [], {}
     introductions = []
-    reached = headers_of(folder, "qx.h") if (folder / "qx.h").exists() else None
     families = sorted(p for p in folder.glob("*.h") if p.name not in NOT_A_FAMILY)
     parsed = [(path, list(statements_of(path, path.read_text("utf-8"))))
               for path in [folder / "types.h", *families]]
@@ -431,8 +420,6 @@ def read_headers(include):
             if statement.words[0] == "typedef":
                 types.read(path, statement)
     for path, statements in parsed[1:]:
-        if reached is not None and path.name not in reached:
-            raise HeaderError(path, 1, "qx.h does not include this header")
         first = next((t for t in tokens_of(path.read_text("utf-8")) if t.text.startswith("/*")), None)
         introductions.append({"name": path.stem, "header": f"qx/{path.name}",
                               "introduction": documentation_of(first) if first else ""})
@@ -475,6 +462,14 @@ def code_list(catalogue):
                    for export in catalogue["exports"] if export["hasStatus"])
 
 
+def umbrella(catalogue):
+    """qx/qx.h, which includes them all."""
+    headers = sorted(["qx/errors.h", "qx/types.h", *(f["header"] for f in catalogue["families"])])
+    includes = "".join(f'#include "{header}"\n' for header in headers)
+    return ("#ifndef QX_QX_H\n#define QX_QX_H\n\n/* Every export of the module. Written by the build. */"
+            f"\n\n{includes}\n#endif\n")
+
+
 def write_if_changed(path, text):
     """An unchanged file keeps its time, so that nothing is linked anew for it."""
     path = Path(path)
@@ -490,6 +485,7 @@ def main(arguments=None):
     parser.add_argument("--map", metavar="FILE")
     parser.add_argument("--def", metavar="FILE", dest="definition")
     parser.add_argument("--codes", metavar="FILE")
+    parser.add_argument("--umbrella", metavar="FILE")
     options = parser.parse_args(arguments)
     try:
         catalogue = read_headers(options.include)
@@ -504,6 +500,8 @@ def main(arguments=None):
         write_if_changed(options.definition, definition_file(catalogue))
     if options.codes:
         write_if_changed(options.codes, code_list(catalogue))
+    if options.umbrella:
+        write_if_changed(options.umbrella, umbrella(catalogue))
     return 0
 
 

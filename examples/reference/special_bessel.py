@@ -33,19 +33,3 @@ curves(x, {f"H {v}": qx.call("QX_Struve", x, v) for v in (0.0, 1.0, 2.0)})
 #%% Parabolic cylinder functions
 x = np.linspace(-5, 5, 400)
 curves(x, {f"D {v}": qx.call("QX_ParabolicCylinder", x, v) for v in (0.0, 1.0, 2.0, 3.5)}, (-4, 6))
-
-#%% Elliptic integrals and the Jacobian functions
-m = np.linspace(0, 0.999, 300)
-curves(m, {"K(m)": qx.call("QX_Elliptic1", m, np.nan), "E(m)": qx.call("QX_Elliptic2", m, np.nan)},
-       xlabel="m")
-u = np.linspace(-8, 8, 500)
-curves(u, dict(zip(("sn", "cn", "dn", "amplitude"), qx.call("QX_EllipticJ", u, 0.9))), (-2, 2), "u")
-
-#%% Dawson's integral and the Fresnel integrals
-x = np.linspace(-6, 6, 600)
-c, s = qx.call("QX_FresnelIntegrals", x)
-curves(x, {"Dawson": qx.call("QX_Dawson", x), "Fresnel C": c, "Fresnel S": s})
-
-#%% Riemann's zeta function
-x = np.linspace(-14, 6, 600)
-curves(x, {"zeta": qx.call("QX_Zeta", x)}, (-1.5, 3))

@@ -12,3 +12,7 @@ x = np.linspace(0.001, 12, 400)
 curves(x, {f"P({a}, x)": qx.call("QX_Gamma", a, x) for a in (0.5, 2.0, 6.0)})
 x = np.linspace(0.001, 0.999, 400)
 curves(x, {f"I x({a}, {b})": qx.call("QX_Beta", a, b, x) for a, b in ((0.5, 0.5), (2.0, 5.0))})
+
+#%% Riemann's zeta function
+x = np.linspace(-14, 6, 600)
+curves(x, {"zeta": qx.call("QX_Zeta", x)}, (-1.5, 3))

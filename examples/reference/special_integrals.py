@@ -19,3 +19,8 @@ curves(x, {"Shi": qx.call("QX_SinhI", x), "Chi": qx.call("QX_CoshI", x)})
 #%% Dilogarithm
 x = np.linspace(0, 6, 400)
 curves(x, {"Li2(1 - x)": qx.call("QX_Diln", x)})
+
+#%% Dawson's integral and the Fresnel integrals
+x = np.linspace(-6, 6, 600)
+c, s = qx.call("QX_FresnelIntegrals", x)
+curves(x, {"Dawson": qx.call("QX_Dawson", x), "Fresnel C": c, "Fresnel S": s})

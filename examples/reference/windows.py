@@ -6,11 +6,6 @@ window = qx.call("AllWinH", np.ones(8), 1, np.nan, 0, 0)
 print("Hanning, periodic: ", window)
 print("Hanning, symmetric:", qx.call("AllWinH", np.ones(8), 1, np.nan, 0, 1))
 
-#%% Noise bandwidth and coherent gain
-for name, selector in (("rectangle", 0), ("Hanning", 1), ("flat top", 6), ("Dolph-Chebyshev", 61)):
-    constants = qx.call("WinConstByNameH_2016", 1024, selector, np.nan)
-    print(f"{name:16} {constants['enbw']:.4f} bins, gain {constants['cg']:.4f}")
-
 #%% What windows do to leakage
 import matplotlib.pyplot as plt  # hidden
 n = 256

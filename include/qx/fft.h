@@ -1,7 +1,7 @@
 #ifndef QX_FFT_H
 #define QX_FFT_H
 
-/* Fourier transforms of any length, one- and two-dimensional, without padding. Forward: X[k] = sum
+/* Fourier transforms of any length,  without padding. Forward: X[k] = sum
    over j of x[j] exp(-2 pi i j k / n), unscaled. Inverse: the opposite sign and the factor 1/n.
 
    A status of the host that refuses an output is returned as it is. Every status but 0 leaves the
@@ -107,48 +107,6 @@ QX_API ErrorCode InvReOXFFTHCH_IDP(QX_INOUT DBL1D in, QX_OUT DBL1D out,
 /** Gives the plans of an _IDP node back and clears its instance-data word. Null is allowed.
     Codes: none. */
 QX_API ErrorCode TransformUnreserveProc(QX_INOUT InstanceWord *instance);
-
-/** X[r][c] = sum over a and b of x[a][b] exp(-2 pi i (r a / rows + c b / cols)), with x the rows by
-    cols values of `in` from (rowStart, colStart) on, padded with zeros behind its ends; shift
-    concerns both dimensions. Unscaled. slotCols keeps the plan of length cols, slotRows that of
-    length rows.
-    Codes: ErrEmptyInput (in is empty), ErrIndexOutOfRange (a start behind the end),
-    ErrSizesDisagree (rows or cols below 1), ErrOutOfMemory (no memory), the host's status,
-    ErrIndexOutOfRange (a negative start). */
-QX_API ErrorCode CxFFT2D_H(QX_IN CDB2D in, int32_t rowStart, int32_t colStart, int32_t rows,
-                           int32_t cols, int32_t shift, QX_OUT CDB2D out,
-                           QX_INOUT PlanSlot *slotCols, QX_INOUT PlanSlot *slotRows);
-/** As CxFFT2D_H, with its plans in the host's instance data. */
-QX_API ErrorCode CxFFT2D_H_IDP(QX_IN CDB2D in, int32_t rowStart, int32_t colStart, int32_t rows,
-                               int32_t cols, int32_t shift, QX_OUT CDB2D out,
-                               QX_INOUT InstanceWord *instance);
-
-/** As CxFFT2D_H, of a real matrix. */
-QX_API ErrorCode ReFFT2D_H(QX_IN DBL2D in, int32_t rowStart, int32_t colStart, int32_t rows,
-                           int32_t cols, int32_t shift, QX_OUT CDB2D out,
-                           QX_INOUT PlanSlot *slotCols, QX_INOUT PlanSlot *slotRows);
-/** As ReFFT2D_H, with its plans in the host's instance data. */
-QX_API ErrorCode ReFFT2D_H_IDP(QX_IN DBL2D in, int32_t rowStart, int32_t colStart, int32_t rows,
-                               int32_t cols, int32_t shift, QX_OUT CDB2D out,
-                               QX_INOUT InstanceWord *instance);
-
-/** The inverse transform of a rows by cols matrix X, which is in shifted order if `shift` is
-    non-zero: x[a][b] = 1/(rows cols) sum over r and c of X[r][c] exp(2 pi i (r a / rows + c b /
-    cols)). slotCols keeps the plan of the column count, slotRows that of the row count.
-    Codes: ErrEmptyInput (in is empty), ErrOutOfMemory (no memory), the host's status. */
-QX_API ErrorCode CxInvFFT2D_H(QX_IN CDB2D in, int32_t shift, QX_OUT CDB2D out,
-                              QX_INOUT PlanSlot *slotCols, QX_INOUT PlanSlot *slotRows);
-/** As CxInvFFT2D_H, with its plans in the host's instance data. */
-QX_API ErrorCode CxInvFFT2D_H_IDP(QX_IN CDB2D in, int32_t shift, QX_OUT CDB2D out,
-                                  QX_INOUT InstanceWord *instance);
-
-/** As CxInvFFT2D_H, of the spectrum of a real matrix: rows of negative row frequency are not
-    read. */
-QX_API ErrorCode ReInvFFT2D_H(QX_IN CDB2D in, int32_t shift, QX_OUT DBL2D out,
-                              QX_INOUT PlanSlot *slotCols, QX_INOUT PlanSlot *slotRows);
-/** As ReInvFFT2D_H, with its plans in the host's instance data. */
-QX_API ErrorCode ReInvFFT2D_H_IDP(QX_IN CDB2D in, int32_t shift, QX_OUT DBL2D out,
-                                  QX_INOUT InstanceWord *instance);
 
 QX_END_DECLS
 

@@ -1,9 +1,9 @@
 #ifndef QX_SPECIAL_BESSEL_H
 #define QX_SPECIAL_BESSEL_H
 
-/* Bessel functions and their kin, elliptic integrals and functions, Dawson, Fresnel, zeta. NaN in
-   gives NaN. docs/accuracy has the measured errors. The numbers of formulas are those of
-   M. Abramowitz and I. A. Stegun, Handbook of mathematical functions, 1964. */
+/* Bessel functions and their kin. NaN in gives NaN. docs/accuracy has the measured errors. The
+   numbers of formulas are those of M. Abramowitz and I. A. Stegun, Handbook of mathematical
+   functions, 1964. */
 
 #include "qx/types.h"
 
@@ -62,44 +62,6 @@ QX_API void QX_Struve(double x, double v, QX_OUT DBL *value);
     vanishes at +infinity (19.3.7): the asymptotic series (19.8.1), the two series at 0 (19.2.1,
     19.2.3) and recurrence in the order (19.6.4). 0 at +infinity; NaN for infinite v. */
 QX_API void QX_ParabolicCylinder(double x, double v, QX_OUT DBL *value);
-
-/** Elliptic integral of the first kind by its parameter m = k^2: complete, K(m) = F(pi / 2, m),
-    where phi is NaN, else F(phi, m), the integral of (1 - m sin^2(t))^(-1/2) from 0 to phi
-    (17.2). Complete by a rational form and the logarithm of 1 - m, incomplete by Landen's
-    descending transformation (17.6.8). NaN for m outside [0, 1]. */
-QX_API void QX_Elliptic1(double m, double phi, QX_OUT DBL *value);
-
-/** As QX_Elliptic1, with a selector for what a NaN says there: 1 complete, otherwise incomplete. */
-QX_API void QX_Elliptic1_85(double m, double phi, QX_OUT DBL *value, int32_t selector);
-
-/** Elliptic integral of the second kind: complete, E(m), where phi is NaN, else E(phi, m), the
-    integral of (1 - m sin^2(t))^(1/2) from 0 to phi, by the same methods. NaN for m outside [0,
-    1]. */
-QX_API void QX_Elliptic2(double m, double phi, QX_OUT DBL *value);
-
-/** As QX_Elliptic2, with a selector for what a NaN says there: 1 complete, otherwise incomplete. */
-QX_API void QX_Elliptic2_85(double m, double phi, QX_OUT DBL *value, int32_t selector);
-
-/** Jacobian elliptic functions sn = sin(phi), cn = cos(phi), dn = (1 - m sn^2)^(1/2) of u with
-    parameter m, and the amplitude phi, for which F(phi, m) = u: by arithmetic-geometric means
-    (16.4), next to m = 0 and m = 1 by circular and hyperbolic functions (16.13, 16.15). Each
-    pointer may be null. NaN for m outside [0, 1]. */
-QX_API void QX_EllipticJ(double u, double m, QX_OUT DBL *sn, QX_OUT DBL *cn, QX_OUT DBL *dn,
-                         QX_OUT DBL *phi);
-
-/** Dawson's integral, exp(-x^2) times the integral of exp(t^2) from 0 to x, by rational functions
-    of x^2 up to |x| = 3.25, of 1 / x^2 beyond. NaN for infinities. */
-QX_API void QX_Dawson(double x, QX_OUT DBL *value);
-
-/** Fresnel integrals C(x) and S(x): of cos(pi t^2 / 2) and sin(pi t^2 / 2) from 0 to x (7.3.1,
-    7.3.2), by rational functions of x^4 up to |x| = 1.6, by the auxiliary functions (7.3.9,
-    7.3.10) beyond. -1/2 and 1/2 at the infinities. */
-QX_API void QX_FresnelIntegrals(double x, QX_OUT DBL *c, QX_OUT DBL *s);
-
-/** Riemann's zeta function, the sum of k^-x for x > 1 (23.2.1) and its continuation: rational
-    forms up to x = 50, the sum over odd k (23.2.20) beyond, the reflection (23.2.6) for x < 0.
-    NaN for x < -30.8148; +infinity at 1 and at +infinity. */
-QX_API void QX_Zeta(double x, QX_OUT DBL *value);
 
 QX_END_DECLS
 

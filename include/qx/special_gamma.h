@@ -1,9 +1,9 @@
-#ifndef QX_SPECIAL_GAMMA_H
-#define QX_SPECIAL_GAMMA_H
+#ifndef QX_SPECIAL_GAMMA_EXPORTS_H
+#define QX_SPECIAL_GAMMA_EXPORTS_H
 
-/* The gamma and beta functions, factorials, the digamma function. docs/accuracy has the measured
-   errors. Source of the formulas: M. Abramowitz and I. A. Stegun, Handbook of mathematical
-   functions, 1964, chapters 6 and 26. */
+/* The gamma and beta functions, factorials, the digamma and the zeta function. docs/accuracy has
+   the measured errors. The numbers of formulas are those of M. Abramowitz and I. A. Stegun,
+   Handbook of mathematical functions, 1964. */
 
 #include "qx/types.h"
 
@@ -52,6 +52,11 @@ QX_API void QX_Stirling(double x, QX_OUT DBL *value);
 /** Digamma function psi(x), the derivative of ln gamma(x) (6.3.2, 6.3.5, 6.3.7, 6.3.18). +infinity
     at the poles 0, -1, -2, ... and at +infinity; NaN at -infinity and NaN. */
 QX_API void QX_Psi(double x, QX_OUT DBL *value);
+
+/** Riemann's zeta function, the sum of k^-x for x > 1 (23.2.1) and its continuation: rational
+    forms up to x = 50, the sum over odd k (23.2.20) beyond, the reflection (23.2.6) for x < 0.
+    NaN for x < -30.8148; +infinity at 1 and at +infinity. */
+QX_API void QX_Zeta(double x, QX_OUT DBL *value);
 
 QX_END_DECLS
 

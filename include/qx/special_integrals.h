@@ -1,9 +1,10 @@
 #ifndef QX_SPECIAL_INTEGRALS_H
 #define QX_SPECIAL_INTEGRALS_H
 
-/* The error function, the exponential, sine, cosine and hyperbolic integrals, the dilogarithm. NaN
-   in gives NaN. docs/accuracy has the measured errors. The numbers of formulas are those of
-   M. Abramowitz and I. A. Stegun, Handbook of mathematical functions, 1964. */
+/* The error function, the exponential, sine, cosine and hyperbolic integrals, the dilogarithm,
+   Dawson's and the Fresnel integrals. NaN in gives NaN. docs/accuracy has the measured errors. The
+   numbers of formulas are those of M. Abramowitz and I. A. Stegun, Handbook of mathematical
+   functions, 1964. */
 
 #include "qx/types.h"
 
@@ -43,6 +44,15 @@ QX_API void QX_CoshI(double x, QX_OUT DBL *value);
     on [0.5, 1.5], the reflections 27.7.3 and 27.7.5 outside. NaN for x < 0; pi^2 / 6 at 0, 0 at 1,
     -infinity at +infinity. */
 QX_API void QX_Diln(double x, QX_OUT DBL *value);
+
+/** Dawson's integral, exp(-x^2) times the integral of exp(t^2) from 0 to x, by rational functions
+    of x^2 up to |x| = 3.25, of 1 / x^2 beyond. NaN for infinities. */
+QX_API void QX_Dawson(double x, QX_OUT DBL *value);
+
+/** Fresnel integrals C(x) and S(x): of cos(pi t^2 / 2) and sin(pi t^2 / 2) from 0 to x (7.3.1,
+    7.3.2), by rational functions of x^4 up to |x| = 1.6, by the auxiliary functions (7.3.9,
+    7.3.10) beyond. -1/2 and 1/2 at the infinities. */
+QX_API void QX_FresnelIntegrals(double x, QX_OUT DBL *c, QX_OUT DBL *s);
 
 QX_END_DECLS
 

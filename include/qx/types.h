@@ -76,11 +76,11 @@ typedef struct __attribute__((may_alias)) Array2DBlock {
 #define QX_ARRAY_1D(element)                                                                       \
     struct __attribute__((may_alias)) QXArray1D_##element {                                        \
         int32_t dimSize;                                                                           \
-    } **
+    } * *
 #define QX_ARRAY_2D(element)                                                                       \
     struct __attribute__((may_alias)) QXArray2D_##element {                                        \
         int32_t dimSizes[2];                                                                       \
-    } **
+    } * *
 typedef QX_ARRAY_1D(I32) I32_1D;
 typedef QX_ARRAY_1D(U8) U8_1D;
 typedef QX_ARRAY_1D(U32) U32_1D;

@@ -178,23 +178,6 @@ QX_API int32_t TriangleWin(QX_INOUT DBL1D x, QX_OUT ErrorCode *err);
 /** As CosTaperedH, with a taper ratio of 0.2 and its code in *err; the function result is 0. */
 QX_API int32_t CosTapered(QX_INOUT DBL1D x, QX_OUT ErrorCode *err);
 
-/** The constants of the window held in an array, measured in one pass.
-    Codes: ErrEmptyInput (window is empty). Both constants are then NaN. */
-QX_API ErrorCode NumWinConstH(QX_IN DBL1D window, QX_OUT WindowConstants *constants);
-/** The constants of a named window of n samples: stored values for selectors 0 to 9 and 11,
-    measured ones for 30 to 34 and 60 to 62. The parameter is used as it stands; that of selector 61
-    is a linear ratio.
-    Codes: ErrEmptyInput (n is below 1), ErrInvalidSelector (another selector), ErrOutOfMemory (no
-    scratch memory or no plan). Both constants are then NaN. */
-QX_API ErrorCode WinConstByNameH(int32_t n, int32_t selector, double param,
-                                 QX_OUT WindowConstants *constants);
-/** As WinConstByNameH, with the parameter taken as AllWinH takes it: a NaN, for selectors 61 and 62
-    also a negative value, means the default, and that of selector 61 is in decibels.
-    Codes: ErrEmptyInput (n is below 1), ErrInvalidSelector (another selector), ErrOutOfMemory (no
-    scratch memory or no plan). Both constants are then NaN. */
-QX_API ErrorCode WinConstByNameH_2016(int32_t n, int32_t selector, double param,
-                                      QX_OUT WindowConstants *constants);
-
 QX_END_DECLS
 
 #endif

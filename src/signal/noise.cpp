@@ -5,7 +5,7 @@
 #include "frame/elements.h"
 #include "frame/scratch.h"
 #include "signal/random.h"
-#include "stats/gamma.h"
+#include "special/gamma.h"
 
 #include <algorithm>
 #include <cmath>

@@ -5,7 +5,7 @@
 #include "special/extended.h"
 #include "special/rational.h"
 #include "special/reciprocal_gamma.h"
-#include "stats/gamma.h"
+#include "special/gamma.h"
 
 #include <cmath>
 

@@ -1,7 +1,7 @@
 #include "special/exponential_integral.h"
 
 #include "frame/constants.h"
-#include "stats/gamma.h"
+#include "special/gamma.h"
 
 #include <array>
 #include <cmath>

@@ -2,7 +2,7 @@
 
 #include "frame/constants.h"
 #include "special/extended.h"
-#include "stats/gamma.h"
+#include "special/gamma.h"
 
 #include <array>
 #include <cstddef>

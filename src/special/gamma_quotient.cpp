@@ -3,7 +3,7 @@
 #include "frame/constants.h"
 #include "special/extended.h"
 #include "special/reciprocal_gamma.h"
-#include "stats/gamma.h"
+#include "special/gamma.h"
 
 #include <cmath>
 

@@ -1,7 +1,7 @@
 #include "stats/distributions.h"
 
 #include "frame/constants.h"
-#include "stats/gamma.h"
+#include "special/gamma.h"
 
 #include <cmath>
 

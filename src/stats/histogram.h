@@ -3,7 +3,7 @@
 
 #include "frame/elements.h"
 #include "qx/errors.h"
-#include "qx/stats.h"
+#include "qx/histogram.h"
 
 namespace qx {
 

@@ -1,6 +1,6 @@
 #include "fft/plan.h"
 #include "fft/plan_slot.h"
-#include "qx/stats.h"
+#include "qx/histogram.h"
 #include "qx/types.h"
 
 #include <cstddef>

@@ -1,6 +1,5 @@
-#include "tests/support/recipe.h"
-
 #include "qx/fft.h"
+#include "tests/support/recipe.h"
 
 namespace qx::test {
 
@@ -12,7 +11,7 @@ constexpr unsigned Transform = HostStatusPassesThrough | UsesHeap;
 
 void **Instance(Call &c) { return c.instance(TransformUnreserveProc); }
 
-std::vector<Recipe> OneDimensional() {
+std::vector<Recipe> FFTRecipes() {
     return {
         {"CxOXFFTH", [](Call &c) { return CxOXFFTH(c.in<CDB>(0), c.out<CDB>(0), c.slot(0)); },
          Transform},
@@ -66,73 +65,6 @@ std::vector<Recipe> OneDimensional() {
          [](Call &c) { return InvReOXFFTHCH_IDP(c.spoiled<DBL>(0), c.out<DBL>(0), Instance(c)); },
          Transform},
     };
-}
-
-// Matrices of size/4 + 1 by 7 values, of which a padded region is taken.
-int32_t Rows(const Call &c) { return c.n / 4 + 1; }
-constexpr int32_t Cols = 7;
-
-// A failed column transform of an inverse is not reported.
-constexpr unsigned Inverse2D = Transform | MemoryFailureMayPass;
-
-std::vector<Recipe> TwoDimensional() {
-    return {
-        {"CxFFT2D_H",
-         [](Call &c) {
-             return CxFFT2D_H(c.in2D<CDB>(0, Rows(c), Cols), 0, 2, Rows(c) + 1, 6, 1,
-                              c.out2D<CDB>(0), c.slot(0), c.slot(1));
-         },
-         Transform},
-        {"CxFFT2D_H_IDP",
-         [](Call &c) {
-             return CxFFT2D_H_IDP(c.in2D<CDB>(0, Rows(c), Cols), 0, 0, Rows(c), Cols, 0,
-                                  c.out2D<CDB>(0), Instance(c));
-         },
-         Transform},
-        {"ReFFT2D_H",
-         [](Call &c) {
-             return ReFFT2D_H(c.in2D<DBL>(0, Rows(c), Cols), 0, 2, Rows(c) + 1, 6, 1,
-                              c.out2D<CDB>(0), c.slot(0), c.slot(1));
-         },
-         Transform},
-        {"ReFFT2D_H_IDP",
-         [](Call &c) {
-             return ReFFT2D_H_IDP(c.in2D<DBL>(0, Rows(c), Cols), 0, 0, Rows(c), Cols, 0,
-                                  c.out2D<CDB>(0), Instance(c));
-         },
-         Transform},
-        {"CxInvFFT2D_H",
-         [](Call &c) {
-             return CxInvFFT2D_H(c.in2D<CDB>(0, Rows(c), Cols), 1, c.out2D<CDB>(0), c.slot(0),
-                                 c.slot(1));
-         },
-         Inverse2D},
-        {"CxInvFFT2D_H_IDP",
-         [](Call &c) {
-             return CxInvFFT2D_H_IDP(c.in2D<CDB>(0, Rows(c), Cols), 0, c.out2D<CDB>(0),
-                                     Instance(c));
-         },
-         Inverse2D},
-        {"ReInvFFT2D_H",
-         [](Call &c) {
-             return ReInvFFT2D_H(c.in2D<CDB>(0, Rows(c), Cols), 1, c.out2D<DBL>(0), c.slot(0),
-                                 c.slot(1));
-         },
-         Inverse2D},
-        {"ReInvFFT2D_H_IDP",
-         [](Call &c) {
-             return ReInvFFT2D_H_IDP(c.in2D<CDB>(0, Rows(c), Cols), 0, c.out2D<DBL>(0),
-                                     Instance(c));
-         },
-         Inverse2D},
-    };
-}
-
-std::vector<Recipe> FFTRecipes() {
-    std::vector<Recipe> recipes = OneDimensional();
-    const std::vector<Recipe> second = TwoDimensional();
-    recipes.insert(recipes.end(), second.begin(), second.end());
-    return recipes;
 }
 
 const RecipeFile file(FFTRecipes);

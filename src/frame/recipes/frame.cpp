@@ -5,7 +5,8 @@ namespace qx::test {
 namespace {
 
 const RecipeFile file = {
-    {"InitializeAnalysisWorkspaceH", "no arrays; the tests of the workspace drive the four together"},
+    {"InitializeAnalysisWorkspaceH",
+     "no arrays; the tests of the workspace drive the four together"},
     {"EnableAnalysisWorkspaceH", "as above"},
     {"DisableAnalysisWorkspaceH", "as above"},
     {"UninitializeAnalysisWorkspaceH", "as above"},

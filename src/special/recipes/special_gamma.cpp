@@ -63,6 +63,7 @@ std::vector<Recipe> SpecialGammaRecipes() {
         OfNumber("QX_LnGamma", QX_LnGamma),
         OfNumber("QX_Stirling", QX_Stirling),
         OfNumber("QX_Psi", QX_Psi),
+        OfNumber("QX_Zeta", QX_Zeta),
     };
 }
 

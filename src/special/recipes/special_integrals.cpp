@@ -24,6 +24,14 @@ std::vector<Recipe> SpecialIntegralRecipes() {
         OfNumber("QX_SinhI", QX_SinhI),
         OfNumber("QX_CoshI", QX_CoshI),
         OfNumber("QX_Diln", QX_Diln),
+        OfNumber("QX_Dawson", QX_Dawson),
+        {"QX_FresnelIntegrals",
+         [](Call &c) {
+             QX_FresnelIntegrals(0.3 * c.n, c.scalar(0), c.scalar(1));
+             QX_FresnelIntegrals(-7.7 * c.n, c.scalar(2), c.scalar(3));
+             return 0;
+         },
+         NoStatus},
     };
 }
 

@@ -27,6 +27,7 @@ const qx::test::ExportMap &Exports() {
         {"LnGamma", [](In a, double *o) { QX_LnGamma(a[0], o); }},
         {"Stirling", [](In a, double *o) { QX_Stirling(a[0], o); }},
         {"Psi", [](In a, double *o) { QX_Psi(a[0], o); }},
+        {"Zeta", [](In a, double *o) { QX_Zeta(a[0], o); }},
     };
     return exports;
 }
@@ -90,6 +91,12 @@ TEST(SpecialGamma, KeepsTheRulesOfDomainsAndLimits) {
         {"Beta", {-2, 3, 0.5}, kNaN},
         {"Beta", {2, 3, 1.5}, kNaN},
         {"Beta", {2, 3, kInfinity}, kNaN},
+        {"Zeta", {kInfinity, 0}, kInfinity},
+        {"Zeta", {1, 0}, kInfinity},
+        {"Zeta", {-kInfinity, 0}, kNaN},
+        {"Zeta", {-30.82, 0}, kNaN},
+        {"Zeta", {127, 0}, 1},
+        {"Zeta", {-4, 0}, 0},
     };
     for (const auto &rule : rules)
         qx::test::ExpectRule(Exports(), rule);
@@ -152,6 +159,8 @@ TEST(SpecialGamma, LeavesNoStepAtAThreshold) {
         {"GammaP", {7.5, 7.5}, 1, 1e-14},
         {"GammaC", {7.5, 7.5}, 1, 1e-14},
         {"Beta", {4, 2, 0.6666666666666666}, 2, 1e-14},
+        {"Zeta", {10, 0}, 0, 1e-14},
+        {"Zeta", {50, 0}, 0, 1e-15},
     };
     for (const auto &seam : seams)
         qx::test::ExpectNoStep(Exports(), seam);

@@ -25,6 +25,8 @@ const qx::test::ExportMap &Exports() {
         {"SinhI", [](In a, double *o) { QX_SinhI(a[0], o); }},
         {"CoshI", [](In a, double *o) { QX_CoshI(a[0], o); }},
         {"Diln", [](In a, double *o) { QX_Diln(a[0], o); }},
+        {"Dawson", [](In a, double *o) { QX_Dawson(a[0], o); }},
+        {"FresnelIntegrals", [](In a, double *o) { QX_FresnelIntegrals(a[0], o, o + 1); }},
     };
     return exports;
 }
@@ -92,6 +94,10 @@ TEST(SpecialIntegrals, KeepsTheRulesOfDomainsAndLimits) {
         {"Diln", {-1e-300}, kNaN},
         {"Diln", {-kInfinity}, kNaN},
         {"Diln", {kNaN}, kNaN},
+        {"Dawson", {kInfinity, 0}, kNaN},
+        {"Dawson", {kNaN, 0}, kNaN},
+        {"Dawson", {-1e10, 0}, -0.5e-10},
+        {"FresnelIntegrals", {-kInfinity, 0}, -0.5},
     };
     for (const auto &rule : rules)
         qx::test::ExpectRule(Exports(), rule);
@@ -127,15 +133,26 @@ TEST(SpecialIntegrals, ReturnsSoonForAnyArgument) { qx::test::ExpectSoon(Exports
 
 TEST(SpecialIntegrals, LeavesNoStepAtAThreshold) {
     const qx::test::Seam seams[] = {
-        {"Erf", {1}, 0, 1e-15},     {"ErfC", {1}, 0, 2e-15},
+        {"Erf", {1}, 0, 1e-15},
+        {"ErfC", {1}, 0, 2e-15},
         {"ErfC", {8}, 0, 5e-14}, // the argument's step counts 128 times
-        {"ExpI", {1, 1}, 0, 1e-14}, {"ExpI", {1, 40}, 0, 1e-14},
-        {"SinI", {4}, 0, 1e-15},    {"SinI", {8}, 0, 1e-15},
-        {"CosI", {4}, 0, 1e-14},    {"CosI", {8}, 0, 1e-14},
-        {"SinhI", {8}, 0, 1e-14},   {"SinhI", {18}, 0, 1e-13},
-        {"CoshI", {8}, 0, 1e-14},   {"CoshI", {18}, 0, 1e-13},
-        {"Diln", {0.5}, 0, 1e-15},  {"Diln", {1.5}, 0, 2e-15},
+        {"ExpI", {1, 1}, 0, 1e-14},
+        {"ExpI", {1, 40}, 0, 1e-14},
+        {"SinI", {4}, 0, 1e-15},
+        {"SinI", {8}, 0, 1e-15},
+        {"CosI", {4}, 0, 1e-14},
+        {"CosI", {8}, 0, 1e-14},
+        {"SinhI", {8}, 0, 1e-14},
+        {"SinhI", {18}, 0, 1e-13},
+        {"CoshI", {8}, 0, 1e-14},
+        {"CoshI", {18}, 0, 1e-13},
+        {"Diln", {0.5}, 0, 1e-15},
+        {"Diln", {1.5}, 0, 2e-15},
         {"Diln", {2}, 0, 1e-15},
+        {"Dawson", {3.25, 0}, 0, 1e-14},
+        {"Dawson", {6.25, 0}, 0, 1e-14},
+        {"FresnelIntegrals", {1.6, 0}, 0, 1e-14},
+        {"FresnelIntegrals", {3, 0}, 0, 1e-14},
     };
     for (const auto &seam : seams)
         qx::test::ExpectNoStep(Exports(), seam);

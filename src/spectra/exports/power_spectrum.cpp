@@ -2,7 +2,7 @@
 
 #include "fft/plan_slot.h"
 #include "frame/export.h"
-#include "qx/spectra.h"
+#include "qx/power_spectrum.h"
 
 namespace qx {
 namespace {

@@ -1,6 +1,6 @@
 #include "fft/plan_slot.h"
 #include "qx/errors.h"
-#include "qx/spectra.h"
+#include "qx/power_spectrum.h"
 #include "spectra/power_spectrum.h"
 #include "tests/support/hostile_host.h"
 #include "tests/support/transform_reference.h"

@@ -1,7 +1,7 @@
 #include "stats/histogram.h"
 
 #include "frame/export.h"
-#include "qx/stats.h"
+#include "qx/histogram.h"
 #include "stats/order.h"
 
 namespace qx {

@@ -1,4 +1,5 @@
-#include "qx/qx.h"
+#include "qx/anova.h"
+#include "qx/errors.h"
 #include "tests/support/hostile_host.h"
 #include "tests/support/test_data.h"
 

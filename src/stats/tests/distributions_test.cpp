@@ -1,5 +1,6 @@
-#include "qx/qx.h"
-#include "stats/tests/table.h"
+#include "qx/distributions.h"
+#include "qx/errors.h"
+#include "tests/support/table.h"
 #include "tests/support/test_data.h"
 
 #include <gtest/gtest.h>

@@ -1,4 +1,5 @@
-#include "qx/qx.h"
+#include "qx/errors.h"
+#include "qx/histogram.h"
 #include "stats/histogram.h"
 #include "tests/support/heap_probe.h"
 #include "tests/support/hostile_host.h"
@@ -146,7 +147,8 @@ General GeneralOf(const std::vector<double> &samples, const std::vector<HistInte
     (*records.handle())->dimSize = static_cast<int32_t>(intervals.size());
     const I32Array counts(9);
     General result = {{}, {7, 7, 7}, 1};
-    EXPECT_EQ(GenHistH(x.handle(), reinterpret_cast<HistInterval1D>(records.handle()), counts.handle(), &result.summary, &result.err),
+    EXPECT_EQ(GenHistH(x.handle(), reinterpret_cast<HistInterval1D>(records.handle()),
+                       counts.handle(), &result.summary, &result.err),
               0);
     result.counts = counts.values();
     return result;
@@ -164,7 +166,8 @@ TEST(GeneralHistogram, WithoutMemoryTheCountsAreSizedAndEmptied) {
     qx::test::ResetHost();
     {
         const HeapProbe probe(1);
-        GenHistH(x.handle(), reinterpret_cast<HistInterval1D>(intervals.handle()), counts.handle(), &summary, &err);
+        GenHistH(x.handle(), reinterpret_cast<HistInterval1D>(intervals.handle()), counts.handle(),
+                 &summary, &err);
     }
     EXPECT_EQ(err, ErrOutOfMemory);
     EXPECT_EQ(qx::test::Host().reshapes,
@@ -198,7 +201,8 @@ TEST(GeneralHistogram, CountsInOverlappingIntervalsAndTellsWhereTheRestLies) {
     const I32Array counts(9);
     HistSummary summary = {7, 7, 7};
     ErrorCode err;
-    GenHistH(x.handle(), reinterpret_cast<HistInterval1D>(negative.handle()), counts.handle(), &summary, &err);
+    GenHistH(x.handle(), reinterpret_cast<HistInterval1D>(negative.handle()), counts.handle(),
+             &summary, &err);
     (*negative.handle())->dimSize = 0;
     EXPECT_EQ(err, ErrSizesDisagree);
     EXPECT_EQ(counts.size(), 0);

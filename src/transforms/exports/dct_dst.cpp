@@ -3,7 +3,7 @@
 #include "fft/plan_slot.h"
 #include "frame/export.h"
 #include "frame/heap_block.h"
-#include "qx/transforms.h"
+#include "qx/dct_dst.h"
 
 namespace qx {
 namespace {

@@ -2,7 +2,7 @@
 
 #include "fft/plan_slot.h"
 #include "frame/export.h"
-#include "qx/transforms.h"
+#include "qx/hartley_hilbert.h"
 
 namespace qx {
 namespace {

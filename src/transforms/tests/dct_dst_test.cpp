@@ -1,6 +1,6 @@
 #include "fft/plan_slot.h"
+#include "qx/dct_dst.h"
 #include "qx/errors.h"
-#include "qx/transforms.h"
 #include "tests/support/heap_probe.h"
 #include "tests/support/hostile_host.h"
 #include "tests/support/test_data.h"

@@ -1,6 +1,6 @@
 #include "fft/plan_slot.h"
+#include "qx/dzt.h"
 #include "qx/errors.h"
-#include "qx/transforms.h"
 #include "tests/support/hostile_host.h"
 #include "tests/support/transform_reference.h"
 #include "transforms/dzt.h"

@@ -1,6 +1,6 @@
 #include "fft/plan_slot.h"
 #include "qx/errors.h"
-#include "qx/transforms.h"
+#include "qx/hartley_hilbert.h"
 #include "tests/support/hostile_host.h"
 #include "tests/support/transform_reference.h"
 

@@ -67,13 +67,6 @@ std::vector<Recipe> WindowRecipes() {
          fromTwo},
         {"TriangleWin", [](Call &c) { return TriangleWin(c.inOut<DBL>(0), c.err()); }},
         {"CosTapered", [](Call &c) { return CosTapered(c.inOut<DBL>(0), c.err()); }},
-        {"NumWinConstH",
-         [](Call &c) { return NumWinConstH(c.in<DBL>(0), c.record<WindowConstants>(0)); }},
-        {"WinConstByNameH",
-         [](Call &c) { return WinConstByNameH(c.n, 32, 0.0, c.record<WindowConstants>(0)); }},
-        {"WinConstByNameH_2016",
-         [](Call &c) { return WinConstByNameH_2016(c.n, 61, 45.0, c.record<WindowConstants>(0)); },
-         UsesHeap},
     };
 }
 

@@ -40,3 +40,7 @@ for a in (0.5, 3.0, 40.0):
     for x in [a / 3, 2 * a] + list(sides(1, a)):
         row("GammaP", [a, x], 0, mpmath.gammainc(mpf(a), 0, mpf(x), regularized=True), 30 + a, 1)
         row("GammaC", [a, x], 0, mpmath.gammainc(mpf(a), mpf(x), regularized=True), 30 + a, 1)
+
+for x in [-30.5, -17.0, -8.3, -1.0, -1e-9, -1e-20, 0.0, 0.5, 0.9999, 1.0001, 2.0, 3.5, 30.0, 30.5, 90.0,
+          126.9] + list(sides(10, 50)):
+    row("Zeta", [x], 0, mpmath.zeta(mpf(x)), 22 if x < 0 else 3)

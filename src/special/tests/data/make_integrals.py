@@ -53,3 +53,9 @@ for x in ORDINARY + [0.5238225713898644, 1.0, 4.0, 7.5, 10.0, 15.0, 25.0, 60.0, 
 for x in ORDINARY + [1e-10, 0.25, 0.497829450764894, 0.5064019646879256, 1 - 2.0**-30, 1 + 2.0**-30, 1.25, 1.75, 3.0, 100.0, 1e9, 1e200] + list(
         sides(0.5, 1, 1.5, 2)):
     row("Diln", [x], 0, mpmath.polylog(2, 1 - mpf(x)), 4)
+
+for x in [1e-200, 0.5, 0.92, 2.0, 5.0, 20.0, 60.0] + list(sides(3.25, 6.25)):
+    row("Dawson", [x], 0, mpmath.sqrt(mpmath.pi) / 2 * mpmath.exp(-mpf(x)**2) * mpmath.erfi(mpf(x)), 4)
+for x in [1e-50, 0.4, 1.0, -2.2, 17.3, 123456.75] + list(sides(1.6, 3)):
+    row("FresnelIntegrals", [x], 0, mpmath.fresnelc(mpf(x)), 4)
+    row("FresnelIntegrals", [x], 1, mpmath.fresnels(mpf(x)), 3)

@@ -1,0 +1,18 @@
+import numpy as np
+import qx
+
+#%% The envelope of a modulated oscillation
+import matplotlib.pyplot as plt  # hidden
+t = np.arange(1000) / 1000
+x = np.exp(-((t - 0.5) / 0.2)**2) * np.cos(2 * np.pi * 40 * t)
+envelope = np.hypot(x, qx.call("FastHilbertTransformH", x))
+print("greatest value of the envelope", envelope.max())
+figure, axes = plt.subplots(figsize=(8, 2.6))  # hidden
+axes.plot(t, x, color="#9db8d9", linewidth=0.8, label="signal")  # hidden
+axes.plot(t, envelope, color="#c8553d", label="envelope")  # hidden
+axes.legend(frameon=False)  # hidden
+axes.set(xlabel="Time (s)", ylabel="Amplitude")  # hidden
+
+#%% The Hartley transform is its own inverse but for 1/n
+x = np.arange(5.0)
+print(qx.call("InvFHTH", qx.call("FHTH", x)))

@@ -1,0 +1,16 @@
+import numpy as np
+import qx
+
+#%% A histogram over the range of the data
+import matplotlib.pyplot as plt  # hidden
+samples = np.random.default_rng(1).gamma(3.0, size=2000)
+counts, centres = qx.call("histgran_head", samples, 30)
+print("the fullest bin is around", centres[np.argmax(counts)])
+figure, axes = plt.subplots(figsize=(8, 2.6))  # hidden
+axes.bar(centres, counts, width=0.9 * (centres[1] - centres[0]), color="#2f6db3")  # hidden
+axes.set(title="2000 gamma variates of shape 3", xlabel="Value", ylabel="Count")  # hidden
+
+#%% Intervals of one's own
+intervals = [(0.0, 1.0, 0), (1.0, 2.0, 0), (2.0, 100.0, 2)]
+counts, summary = qx.call("GenHistH", samples, intervals)
+print(counts, summary)

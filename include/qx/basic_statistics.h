@@ -1,0 +1,37 @@
+#ifndef QX_BASIC_STATISTICS_H
+#define QX_BASIC_STATISTICS_H
+
+/* Mean, mean square and moments.
+
+   Unless noted the function result is 0 and the code stands in *err; a failure sets a numeric
+   result to NaN and empties arrays. Input arrays are never changed. */
+
+#include "qx/types.h"
+
+QX_BEGIN_DECLS
+
+/** Arithmetic mean, sum(x) / n, summed from the first element to the last.
+    Codes: ErrEmptyInput (x is empty). */
+QX_API int32_t Mean_head(QX_IN DBL1D x, QX_OUT DBL *mean, QX_OUT ErrorCode *err);
+
+/** Root mean square, sqrt(sum(x^2) / n). The squares may overflow.
+    Codes: ErrEmptyInput (x is empty). */
+QX_API int32_t RMS_head(QX_IN DBL1D x, QX_OUT DBL *rms, QX_OUT ErrorCode *err);
+
+/** Root mean square of complex values, sqrt(sum(im^2 + re^2) / n). The code is the function result.
+    Codes: ErrEmptyInput (z is empty). */
+QX_API ErrorCode CxRMS_head(QX_IN CDB1D z, QX_OUT DBL *rms);
+
+/** Mean squared difference over the shorter length m, sum(x x + y (y - 2 x)) / m. Where x and y
+    nearly agree the sum loses digits to cancellation.
+    Codes: ErrEmptyInput (x or y is empty), WarnLengthsDiffer (the lengths differ). */
+QX_API int32_t MSE_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_OUT DBL *mse, QX_OUT ErrorCode *err);
+
+/** Central population moment, sum((x - mean)^order) / n; order 2 is the population variance.
+    Codes: ErrEmptyInput (x is empty), ErrOrderNotPositive (the order is below 1). */
+QX_API int32_t Moment_head(QX_IN DBL1D x, QX_IN const int32_t *order, QX_OUT DBL *moment,
+                           QX_OUT ErrorCode *err);
+
+QX_END_DECLS
+
+#endif

@@ -1,0 +1,30 @@
+#ifndef QX_WINDOW_CONSTANTS_H
+#define QX_WINDOW_CONSTANTS_H
+
+/* The constants of windows: equivalent noise bandwidth and coherent gain. Selectors and their
+   parameters are those of qx/windows.h. */
+
+#include "qx/windows.h"
+
+QX_BEGIN_DECLS
+
+/** The constants of the window held in an array, measured in one pass.
+    Codes: ErrEmptyInput (window is empty). Both constants are then NaN. */
+QX_API ErrorCode NumWinConstH(QX_IN DBL1D window, QX_OUT WindowConstants *constants);
+/** The constants of a named window of n samples: stored values for selectors 0 to 9 and 11,
+    measured ones for 30 to 34 and 60 to 62. The parameter is used as it stands; that of selector 61
+    is a linear ratio.
+    Codes: ErrEmptyInput (n is below 1), ErrInvalidSelector (another selector), ErrOutOfMemory (no
+    scratch memory or no plan). Both constants are then NaN. */
+QX_API ErrorCode WinConstByNameH(int32_t n, int32_t selector, double param,
+                                 QX_OUT WindowConstants *constants);
+/** As WinConstByNameH, with the parameter taken as AllWinH takes it: a NaN, for selectors 61 and 62
+    also a negative value, means the default, and that of selector 61 is in decibels.
+    Codes: ErrEmptyInput (n is below 1), ErrInvalidSelector (another selector), ErrOutOfMemory (no
+    scratch memory or no plan). Both constants are then NaN. */
+QX_API ErrorCode WinConstByNameH_2016(int32_t n, int32_t selector, double param,
+                                      QX_OUT WindowConstants *constants);
+
+QX_END_DECLS
+
+#endif

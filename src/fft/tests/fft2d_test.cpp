@@ -1,0 +1,228 @@
+#include "fft/plan_slot.h"
+#include "qx/errors.h"
+#include "qx/fft2d.h"
+#include "tests/support/hostile_host.h"
+#include "tests/support/transform_reference.h"
+
+#include <gtest/gtest.h>
+
+#include <limits>
+
+namespace {
+
+using qx::test::CDBMatrix;
+using qx::test::DBLMatrix;
+using qx::test::Dft;
+using qx::test::Host;
+using qx::test::LongSpectrum;
+using qx::test::MaxError;
+using qx::test::Node;
+using qx::test::RandomComplex;
+using qx::test::RandomSignal;
+using qx::test::ResetHost;
+using qx::test::Reshape;
+using qx::test::SameBits;
+using qx::test::Signal;
+using qx::test::ToLong;
+
+constexpr double Rounding = 2e-15;
+
+struct Shape {
+    int32_t rows, cols;
+};
+
+CDBMatrix &Fill(CDBMatrix &matrix, uint64_t seed = 1) {
+    const std::vector<CDB> values = RandomComplex(matrix.size(), seed);
+    std::copy(values.begin(), values.end(), matrix.data());
+    return matrix;
+}
+DBLMatrix &Fill(DBLMatrix &matrix, uint64_t seed = 1) {
+    const Signal values = RandomSignal(matrix.size(), seed);
+    for (int32_t i = 0; i < matrix.size(); ++i)
+        matrix.data()[i] = values[i];
+    return matrix;
+}
+
+// The region of `matrix` from (rowStart, colStart) on, padded with zeros, transformed by the
+// definition and put in order.
+template <class Matrix>
+LongSpectrum Expected(const Matrix &matrix, Shape start, Shape size, int32_t shift) {
+    LongSpectrum region(std::size_t(size.rows) * size.cols);
+    for (int32_t r = 0; r < size.rows && start.rows + r < matrix.rows(); ++r)
+        for (int32_t c = 0; c < size.cols && start.cols + c < matrix.cols(); ++c)
+            region[r * size.cols + c] = ToLong(matrix.at(start.rows + r, start.cols + c));
+    LongSpectrum half(region.size()), result(region.size());
+    for (int32_t r = 0; r < size.rows; ++r) {
+        const LongSpectrum row =
+            Dft({region.begin() + r * size.cols, region.begin() + (r + 1) * size.cols});
+        std::copy(row.begin(), row.end(), half.begin() + r * size.cols);
+    }
+    for (int32_t c = 0; c < size.cols; ++c) {
+        LongSpectrum column(size.rows);
+        for (int32_t r = 0; r < size.rows; ++r)
+            column[r] = half[r * size.cols + c];
+        column = Dft(column);
+        const int32_t toRow = shift != 0 ? size.rows / 2 : 0;
+        const int32_t toCol = shift != 0 ? size.cols / 2 : 0;
+        for (int32_t r = 0; r < size.rows; ++r)
+            result[(r + toRow) % size.rows * size.cols + (c + toCol) % size.cols] = column[r];
+    }
+    return result;
+}
+
+TEST(TwoDimensional, ForwardTakesARegionPadsAndShifts) {
+    DBLMatrix real(5, 7);
+    CDBMatrix complex(5, 7);
+    Fill(real);
+    Fill(complex);
+    Node node;
+    for (Shape size :
+         {Shape{1, 1}, {1, 6}, {5, 1}, {4, 4}, {4, 5}, {5, 4}, {5, 5}, {5, 7}, {8, 19}})
+        for (Shape start : {Shape{0, 0}, {0, 3}, {2, 0}, {4, 6}})
+            for (int32_t shift : {0, 1}) {
+                SCOPED_TRACE(testing::Message() << size.rows << "x" << size.cols << " from "
+                                                << start.rows << "," << start.cols << " " << shift);
+                CDBMatrix out, twin;
+                ASSERT_EQ(CxFFT2D_H(complex.handle(), start.rows, start.cols, size.rows, size.cols,
+                                    shift, out.handle(), &node.slot, &node.second),
+                          0);
+                EXPECT_EQ(out.rows(), size.rows);
+                EXPECT_LT(MaxError(out.values(), Expected(complex, start, size, shift)), Rounding);
+                ASSERT_EQ(CxFFT2D_H_IDP(complex.handle(), start.rows, start.cols, size.rows,
+                                        size.cols, shift, twin.handle(), &node.instance),
+                          0);
+                EXPECT_TRUE(SameBits(out.values(), twin.values()));
+
+                ASSERT_EQ(ReFFT2D_H(real.handle(), start.rows, start.cols, size.rows, size.cols,
+                                    shift, out.handle(), &node.slot, &node.second),
+                          0);
+                EXPECT_LT(MaxError(out.values(), Expected(real, start, size, shift)), Rounding);
+                ASSERT_EQ(ReFFT2D_H_IDP(real.handle(), start.rows, start.cols, size.rows, size.cols,
+                                        shift, twin.handle(), &node.instance),
+                          0);
+                EXPECT_TRUE(SameBits(out.values(), twin.values()));
+            }
+}
+
+TEST(TwoDimensional, InversesReturnTheMatrix) {
+    const double nan = std::numeric_limits<double>::quiet_NaN();
+    for (Shape size : {Shape{1, 1}, {1, 6}, {6, 1}, {4, 4}, {4, 19}, {5, 4}, {7, 23}})
+        for (int32_t shift : {0, 1}) {
+            SCOPED_TRACE(testing::Message() << size.rows << "x" << size.cols << " " << shift);
+            DBLMatrix real(size.rows, size.cols);
+            CDBMatrix complex(size.rows, size.cols);
+            Fill(real);
+            Fill(complex);
+            CDBMatrix spectrum, complexBack, complexTwin;
+            DBLMatrix realBack, realTwin;
+            Node node;
+            ASSERT_EQ(CxFFT2D_H(complex.handle(), 0, 0, size.rows, size.cols, shift,
+                                spectrum.handle(), &node.slot, &node.second),
+                      0);
+            ASSERT_EQ(CxInvFFT2D_H(spectrum.handle(), shift, complexBack.handle(), &node.slot,
+                                   &node.second),
+                      0);
+            EXPECT_LT(MaxError(complexBack.values(), ToLong(complex.values())), Rounding);
+            ASSERT_EQ(
+                CxInvFFT2D_H_IDP(spectrum.handle(), shift, complexTwin.handle(), &node.instance),
+                0);
+            EXPECT_TRUE(SameBits(complexBack.values(), complexTwin.values()));
+
+            ASSERT_EQ(ReFFT2D_H(real.handle(), 0, 0, size.rows, size.cols, shift, spectrum.handle(),
+                                &node.slot, &node.second),
+                      0);
+            // Rows of negative row frequency are not read.
+            for (int32_t f = size.rows / 2 + 1; f < size.rows; ++f)
+                for (int32_t c = 0; c < size.cols; ++c) {
+                    const int32_t r = (f + (shift != 0 ? size.rows / 2 : 0)) % size.rows;
+                    spectrum.data()[r * size.cols + c] = {nan, nan};
+                }
+            ASSERT_EQ(
+                ReInvFFT2D_H(spectrum.handle(), shift, realBack.handle(), &node.slot, &node.second),
+                0);
+            EXPECT_EQ(realBack.rows(), size.rows);
+            EXPECT_LT(MaxError(realBack.values(), ToLong(real.values())), Rounding);
+            ASSERT_EQ(ReInvFFT2D_H_IDP(spectrum.handle(), shift, realTwin.handle(), &node.instance),
+                      0);
+            EXPECT_TRUE(SameBits(realBack.values(), realTwin.values()));
+        }
+}
+
+TEST(TwoDimensional, ChecksComeInOrder) {
+    DBLMatrix none(0, 3), matrix(2, 3);
+    Fill(matrix);
+    Node node;
+    const auto run = [&](const DBLMatrix &in, Shape start, Shape size) {
+        CDBMatrix out(1, 1);
+        const ErrorCode status = ReFFT2D_H(in.handle(), start.rows, start.cols, size.rows,
+                                           size.cols, 0, out.handle(), &node.slot, &node.second);
+        EXPECT_EQ(out.rows(), 0);
+        EXPECT_EQ(out.cols(), 0);
+        return status;
+    };
+    EXPECT_EQ(run(none, {9, 9}, {0, 0}), ErrEmptyInput);
+    EXPECT_EQ(run(matrix, {2, -1}, {0, 0}), ErrIndexOutOfRange);
+    EXPECT_EQ(run(matrix, {-1, 3}, {0, 0}), ErrIndexOutOfRange);
+    EXPECT_EQ(run(matrix, {-1, 0}, {1, 0}), ErrSizesDisagree);
+    EXPECT_EQ(node.slot, nullptr);
+    const int32_t least = std::numeric_limits<int32_t>::min();
+    EXPECT_EQ(run(matrix, {least, 0}, {2, 3}), ErrIndexOutOfRange);
+    EXPECT_EQ(run(matrix, {0, -1}, {2, 3}), ErrIndexOutOfRange);
+    EXPECT_EQ(static_cast<const qx::PlanCell *>(node.slot)->plan->length, 3)
+        << "a negative start is found last of all, with the plans in their slots";
+    EXPECT_EQ(static_cast<const qx::PlanCell *>(node.second)->plan->length, 2);
+
+    CDBMatrix noneComplex(3, 0), out(1, 1);
+    DBLMatrix realOut(1, 1);
+    EXPECT_EQ(CxInvFFT2D_H(noneComplex.handle(), 0, out.handle(), &node.slot, &node.second),
+              ErrEmptyInput);
+    EXPECT_EQ(out.rows(), 0);
+    EXPECT_EQ(ReInvFFT2D_H(noneComplex.handle(), 0, realOut.handle(), &node.slot, &node.second),
+              ErrEmptyInput);
+    EXPECT_EQ(realOut.rows(), 0);
+}
+
+TEST(TwoDimensional, AHostThatRefusesIsQuotedWithThePlansKept) {
+    CDBMatrix complex(2, 3), out;
+    DBLMatrix real(2, 3), realOut;
+    Fill(complex);
+    Fill(real);
+    for (int32_t hostStatus : {77, -4242}) {
+        Node node;
+        const auto refused = [&](int32_t typeCode, auto call) {
+            ResetHost(1, hostStatus);
+            EXPECT_EQ(call(), hostStatus);
+            EXPECT_EQ(Host().reshapes, (std::vector<Reshape>{{typeCode, 2, 6}, {typeCode, 2, 0}}));
+            ResetHost();
+        };
+        refused(13, [&] {
+            return CxFFT2D_H(complex.handle(), 0, 0, 3, 2, 0, out.handle(), &node.slot,
+                             &node.second);
+        });
+        EXPECT_NE(node.second, nullptr);
+        refused(13, [&] {
+            return ReFFT2D_H_IDP(real.handle(), 0, 0, 3, 2, 0, out.handle(), &node.instance);
+        });
+        refused(13, [&] {
+            return CxInvFFT2D_H(complex.handle(), 0, out.handle(), &node.slot, &node.second);
+        });
+        refused(10, [&] {
+            return ReInvFFT2D_H_IDP(complex.handle(), 0, realOut.handle(), &node.instance);
+        });
+    }
+}
+
+TEST(TwoDimensional, RequestsBeyondMemoryEndInACode) {
+    DBLMatrix real(2, 3);
+    Fill(real);
+    Node node;
+    for (Shape size : {Shape{1 << 16, 1 << 16}, {1 << 20, 1 << 10}}) {
+        CDBMatrix out(1, 1);
+        EXPECT_NE(ReFFT2D_H(real.handle(), 0, 0, size.rows, size.cols, 0, out.handle(), &node.slot,
+                            &node.second),
+                  0);
+        EXPECT_EQ(out.rows(), 0);
+    }
+}
+
+} // namespace

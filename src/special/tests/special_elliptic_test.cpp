@@ -1,0 +1,73 @@
+#include "qx/special_elliptic.h"
+
+#include "special/tests/exports.h"
+#include "tests/support/test_data.h"
+
+#include <gtest/gtest.h>
+
+#include <cmath>
+
+namespace {
+
+using qx::test::kInfinity;
+using qx::test::kNaN;
+
+typedef const qx::test::Arguments &In;
+
+const qx::test::ExportMap &Exports() {
+    static const qx::test::ExportMap exports = {
+        {"Elliptic1", [](In a, double *o) { QX_Elliptic1(a[0], a[1], o); }},
+        {"Elliptic2", [](In a, double *o) { QX_Elliptic2(a[0], a[1], o); }},
+        {"EllipticJ", [](In a, double *o) { QX_EllipticJ(a[0], a[1], o, o + 1, o + 2, o + 3); }},
+    };
+    return exports;
+}
+
+double Value(const char *name, double a, double b = 0, int output = 0) {
+    return qx::test::Value(Exports(), name, {a, b}, output);
+}
+
+TEST(SpecialElliptic, AgreesWithReferencesOnBothSidesOfEachThreshold) {
+    EXPECT_GT(qx::test::ExpectAgreement(Exports(), qx::test::TestData("elliptic.dat")), 250);
+}
+
+TEST(SpecialElliptic, KeepsTheRulesOfDomainsAndLimits) {
+    const qx::test::Rule rules[] = {
+        {"Elliptic1", {-0.1, 1}, kNaN},      {"Elliptic1", {1.1, kNaN}, kNaN},
+        {"Elliptic1", {1, kNaN}, kInfinity}, {"Elliptic2", {1, kNaN}, 1},
+        {"Elliptic1", {0, 0.75}, 0.75},      {"Elliptic1", {0.5, 0}, 0},
+        {"EllipticJ", {1, 1.5}, kNaN},
+    };
+    for (const auto &rule : rules)
+        qx::test::ExpectRule(Exports(), rule);
+}
+
+TEST(SpecialElliptic, SelectsTheCompleteForms) {
+    double complete = 0;
+    QX_Elliptic1_85(0.3, 0.5, &complete, 1);
+    EXPECT_EQ(complete, Value("Elliptic1", 0.3, kNaN));
+    QX_Elliptic1_85(0.3, 0.5, &complete, 2); // anything but 1
+    EXPECT_EQ(complete, Value("Elliptic1", 0.3, 0.5));
+    QX_Elliptic2_85(0.3, 0.5, &complete, 1);
+    EXPECT_EQ(complete, Value("Elliptic2", 0.3, kNaN));
+    QX_Elliptic2_85(0.3, kNaN, &complete, 0); // here a NaN selects nothing
+    EXPECT_TRUE(std::isnan(complete));
+
+    double sn = 0;
+    QX_EllipticJ(0.5, 0.3, &sn, nullptr, nullptr, nullptr);
+    EXPECT_EQ(sn, Value("EllipticJ", 0.5, 0.3));
+    // the amplitude inverts F, also past a quarter period
+    EXPECT_NEAR(Value("Elliptic1", 0.3, Value("EllipticJ", 7.5, 0.3, 3)), 7.5, 1e-13);
+}
+
+TEST(SpecialElliptic, ReturnsSoonForAnyArgument) { qx::test::ExpectSoon(Exports(), 1000000); }
+
+TEST(SpecialElliptic, LeavesNoStepAtAThreshold) {
+    const qx::test::Seam seams[] = {
+        {"Elliptic1", {0.5, kNaN}, 0, 1e-14},
+    };
+    for (const auto &seam : seams)
+        qx::test::ExpectNoStep(Exports(), seam);
+}
+
+} // namespace
