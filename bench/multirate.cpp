@@ -24,8 +24,11 @@
 
 namespace {
 
-using namespace qx::bench;
 using qx::ElementType;
+using qx::bench::HostMemory;
+using qx::bench::Keep;
+using qx::bench::MedianTimes;
+using qx::bench::Ratios;
 
 constexpr int32_t blockSize = 20000;
 
