@@ -14,7 +14,13 @@
 
 namespace {
 
-using namespace qx::test;
+using qx::test::ComplexMatrix;
+using qx::test::Deviation;
+using qx::test::Exact;
+using qx::test::FromUnitary;
+using qx::test::MatrixKind;
+using qx::test::MatrixKinds;
+using qx::test::RealMatrix;
 
 // |a v - w v| is within 4 n eps |a| |v| for every column v of v, and v has unit length. Balancing
 // makes that true of the balanced matrix, so it is held against that; where the scales of rows and

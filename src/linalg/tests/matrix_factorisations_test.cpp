@@ -16,7 +16,21 @@
 
 namespace {
 
-using namespace qx::test;
+using qx::test::CDB2DArray;
+using qx::test::ComplexMatrix;
+using qx::test::Contents;
+using qx::test::DBL2DArray;
+using qx::test::DBLArray;
+using qx::test::Deviation;
+using qx::test::Exact;
+using qx::test::FromUnitary;
+using qx::test::I32Array;
+using qx::test::I32_2DArray;
+using qx::test::Matrix;
+using qx::test::MatrixKind;
+using qx::test::MatrixKinds;
+using qx::test::RealMatrix;
+using qx::test::Vector;
 
 constexpr double inf = std::numeric_limits<double>::infinity();
 const double nan = std::numeric_limits<double>::quiet_NaN();
