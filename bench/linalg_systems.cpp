@@ -24,7 +24,10 @@
 
 namespace {
 
-using namespace qx::bench;
+using qx::bench::Keep;
+using qx::bench::Ratios;
+using qx::bench::RepeatsFor;
+using qx::bench::SecondsOf;
 
 std::vector<double> Random(std::size_t count) {
     std::mt19937_64 random(count);

@@ -15,7 +15,16 @@
 
 namespace {
 
-using namespace qx::test;
+using qx::test::CDB2DArray;
+using qx::test::ComplexMatrix;
+using qx::test::Contents;
+using qx::test::DBL2DArray;
+using qx::test::Deviation;
+using qx::test::Exact;
+using qx::test::Matrix;
+using qx::test::MatrixKinds;
+using qx::test::RealMatrix;
+using qx::test::TestData;
 
 struct Case {
     std::string name;
