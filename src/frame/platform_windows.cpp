@@ -2,6 +2,7 @@
 
 #define WIN32_LEAN_AND_MEAN
 #include <windows.h>
+#undef Yield // a macro that is left from 16-bit times
 
 namespace qx::platform {
 
