@@ -5,7 +5,9 @@
 #include "linalg/matrix.h"
 #include "linalg/products/products.h"
 
+#include <cstring>
 #include <initializer_list>
+#include <limits>
 
 namespace qx {
 
@@ -182,12 +184,32 @@ ErrorCode SolveBySVDRefined(DBL *work, const DBL *a, int32_t m, int32_t n, const
         svd.s[i] = svd.s[i] > cut ? 1.0 / svd.s[i] : 0.0;
     }
     DBL *const rest = work + count - m;
+    // A step depends on x alone. Once x has come back to an earlier one, whole turns of the cycle
+    // are left out: a step usually changes nothing any more after a few, and the count may be any.
+    constexpr int32_t alwaysDone = 16;
+    Scratch<ElementType::DBL> earlier;
+    if (refinements > alwaysDone)
+        if (const ErrorCode failed = earlier.allocate(n))
+            return failed;
+    int32_t noted = alwaysDone; // the round after which `earlier` was taken
     Fill(x, n, 0.0);
     for (int32_t round = 0; round < refinements; ++round) {
         MatrixVectorProduct(a, m, n, x, rest);
         for (int32_t i = 0; i < m; ++i)
             rest[i] = b[i] - rest[i];
         AddSolution(svd, svd.s, rest, rest - svd.k, x);
+        const int32_t done = round + 1;
+        if (refinements <= alwaysDone || done < noted)
+            continue;
+        const auto bytes = sizeof(DBL) * static_cast<std::size_t>(n);
+        if (done > noted && std::memcmp(x, earlier.data(), bytes) == 0) {
+            const int32_t turn = done - noted;
+            round = refinements - 1 - (refinements - done) % turn;
+            noted = std::numeric_limits<int32_t>::max();
+        } else if (done == noted || done / 2 >= noted) {
+            std::memcpy(earlier.data(), x, bytes);
+            noted = done;
+        }
     }
     return status;
 }

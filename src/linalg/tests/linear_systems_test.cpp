@@ -9,6 +9,7 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cstring>
 #include <limits>
 #include <thread>
@@ -262,6 +263,33 @@ TEST(LeastSquares, RefinementReducesTheResidual) {
               0);
     EXPECT_LE(BackwardError(a, n, b, thrice), BackwardError(a, n, b, once));
     EXPECT_LT(BackwardError(a, n, b, thrice), 0.5);
+}
+
+// Any number of refinements ends soon, with the solution that so many steps give.
+TEST(LeastSquares, RefinementsWithoutEndEnd) {
+    const int n = 4;
+    for (const double scale : {1.0, 1e-300, 1e300}) {
+        std::vector<double> a, b(n, 1.0), work(1000);
+        for (int i = 0; i < n * n; ++i)
+            a.push_back(scale / (1 + i / n + i % n));
+        std::vector<std::vector<double>> steps;
+        const auto solve = [&](int32_t refinements) {
+            std::vector<double> x(n);
+            EXPECT_EQ(qx::SolveBySVDRefined(work.data(), a.data(), n, n, b.data(), x.data(), -1.0,
+                                            refinements),
+                      0);
+            return x;
+        };
+        for (int32_t refinements = 1; refinements <= 16; ++refinements)
+            steps.push_back(solve(refinements));
+        const auto isStep = [&](const std::vector<double> &x) {
+            return std::any_of(steps.begin(), steps.end(), [&](const std::vector<double> &step) {
+                return std::memcmp(x.data(), step.data(), n * sizeof(double)) == 0;
+            });
+        };
+        EXPECT_TRUE(isStep(solve(60))) << scale;
+        EXPECT_TRUE(isStep(solve(std::numeric_limits<int32_t>::max()))) << scale;
+    }
 }
 
 // b^H b + 1 of noise.
