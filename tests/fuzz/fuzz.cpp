@@ -395,6 +395,12 @@ private:
         const auto documented = DocumentedCodes().find(thunk_.name);
         if (documented == DocumentedCodes().end() || documented->second.codes.count(status_) != 0)
             return;
+        // The frame copies an input that is also an output, whatever the export.
+        const bool shares =
+            std::any_of(scenario_.arguments.begin(), scenario_.arguments.end(),
+                        [](const Argument &argument) { return argument.aliasOf >= 0; });
+        if (shares && status_ == ErrOutOfMemory)
+            return;
         // A limit of the host's own is a refusal like any other.
         const bool isRefusal =
             (scenario_.refuseAt != 0 && status_ == scenario_.refusal) || status_ == statusNoMemory;

@@ -14,10 +14,16 @@
 
 namespace {
 
+using qx::test::CDB2DArray;
+using qx::test::CDBArray;
 using qx::test::ComplexMatrix;
+using qx::test::Contents;
+using qx::test::DBL2DArray;
+using qx::test::DBLArray;
 using qx::test::Deviation;
 using qx::test::Exact;
 using qx::test::FromUnitary;
+using qx::test::Matrix;
 using qx::test::MatrixKind;
 using qx::test::MatrixKinds;
 using qx::test::RealMatrix;

@@ -10,7 +10,19 @@
 
 namespace {
 
-using namespace qx::test;
+using qx::test::CDB2DArray;
+using qx::test::CDBArray;
+using qx::test::ComplexMatrix;
+using qx::test::Contents;
+using qx::test::DBL2DArray;
+using qx::test::DBLArray;
+using qx::test::Deviation;
+using qx::test::Exact;
+using qx::test::FromUnitary;
+using qx::test::Matrix;
+using qx::test::MatrixKinds;
+using qx::test::RealMatrix;
+using qx::test::Vector;
 
 template <class T>
 std::vector<T> Noisy(int m, int n, int seed);
