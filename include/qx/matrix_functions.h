@@ -14,7 +14,7 @@ QX_BEGIN_DECLS
 /** exp(a) in place of the square matrix a, by scaling, a Pade approximant and repeated squaring; of a
     diagonal matrix element by element. The degree of the approximant follows from the bound 1e-8 /
     (exp(norm) norm) on its error, where norm is the largest row sum of absolute values: relative to
-    the norm of the result the error is up to 1e-9 for norms below 1, and falls to rounding errors as
+    the norm of the result the error is up to 1e-9 for norms up to 2, and falls to rounding errors as
     the norm grows. C. Moler and C. Van Loan, "Nineteen dubious ways to compute the exponential of a
     matrix", 1978.
     Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrOutOfMemory (no memory),
@@ -27,7 +27,7 @@ QX_API int32_t CxMatrixExp_head(QX_INOUT CDB2D a, QX_OUT ErrorCode *err);
     number of the eigenvectors is up to 1e14, refined until its exponential gives a back to a relative
     1e-12; otherwise, and for a singular a, 2^k times ten terms of the series after k square roots. A
     diagonal matrix is taken element by element. The exponential is that of MatrixExp_head, whose own
-    error limits what refinement can tell.
+    error limits what refinement can tell: the error can reach 1e-8, while exp(log(a)) gives a back.
     Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrOutOfMemory (no memory),
     ErrNonFiniteInput (an element, or the result, is not finite), ErrDegenerateValue (a has a zero
     eigenvalue, or square roots did not come near the identity), ErrSingularMatrix (an exponential has

@@ -1,4 +1,4 @@
-"""Writes data/matrix_functions.dat: complex matrices with their exponential, principal logarithm and
+"""Writes matrix_functions.dat: complex matrices with their exponential, principal logarithm and
 principal square root, by mpmath with 60 digits. Numbers are hexadecimal, real and imaginary part."""
 
 import pathlib
@@ -40,7 +40,7 @@ def main():
         assert mpmath.mnorm(mpmath.expm(log) - a) < 1e-40 and mpmath.mnorm(root * root - a) < 1e-40
         lines += [f"{name.replace(' ', '_')} {a.rows}"]
         lines += [words(m) for m in (a, mpmath.expm(a), log, root)]
-    path = pathlib.Path(__file__).parent / "data" / "matrix_functions.dat"
+    path = pathlib.Path(__file__).parent / "matrix_functions.dat"
     path.write_text("\n".join(lines) + "\n")
 
 

@@ -1,0 +1,1 @@
+qx_bench(linalg_factorisations SOURCES linalg_factorisations.cpp)

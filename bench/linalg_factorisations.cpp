@@ -1,0 +1,210 @@
+// Singular values, eigenproblems and factorisations against LAPACK as the module carries it.
+//
+// bench_linalg_factorisations [GROUP...]: svd, values, symmetric, general, qr, cholesky; all by
+// default.
+
+#include "bench/timing.h"
+#include "linalg/blas_memory.h"
+#include "linalg/eigenproblems/general.h"
+#include "linalg/eigenproblems/symmetric.h"
+#include "linalg/factorisations/cholesky.h"
+#include "linalg/factorisations/qr.h"
+#include "linalg/factorisations/svd.h"
+
+#define lapack_complex_float CSG
+#define lapack_complex_double CDB
+#include <lapack.h>
+
+#include <algorithm>
+#include <cstdint>
+#include <random>
+#include <string>
+#include <utility>
+#include <vector>
+
+namespace {
+
+using qx::bench::Ratios;
+using qx::bench::RepeatsFor;
+using qx::bench::SecondsOf;
+
+std::vector<double> Random(int32_t n) {
+    std::mt19937_64 random(static_cast<uint64_t>(n));
+    std::vector<double> x(static_cast<std::size_t>(n) * n);
+    for (double &value : x)
+        value = static_cast<double>(random() >> 11) * 0x1p-53 - 0.5;
+    return x;
+}
+// The lower triangle of a symmetric matrix, with `shift` on the diagonal.
+std::vector<double> Symmetric(int32_t n, double shift) {
+    std::vector<double> a = Random(n);
+    for (int32_t i = 0; i < n; ++i) {
+        a[static_cast<std::size_t>(i) * n + i] += shift;
+        for (int32_t j = 0; j < i; ++j)
+            a[static_cast<std::size_t>(j) * n + i] = a[static_cast<std::size_t>(i) * n + j];
+    }
+    return a;
+}
+
+// Minima of interleaved runs: what else runs on the machine only ever adds.
+template <class Ours, class Peer>
+void Compare(Ratios &ratios, const char *name, int32_t n, const Ours &ours, const Peer &peer) {
+    const std::size_t ourRepeats = RepeatsFor(1e-4, ours), peerRepeats = RepeatsFor(1e-4, peer);
+    double our = 1e9, their = 1e9, taken = 0;
+    for (int round = 0; round < 40 && (round < 5 || taken < 2.0); ++round) {
+        const double first = SecondsOf(ourRepeats, ours), second = SecondsOf(peerRepeats, peer);
+        taken += first + second;
+        our = std::min(our, first / static_cast<double>(ourRepeats));
+        their = std::min(their, second / static_cast<double>(peerRepeats));
+    }
+    std::printf("%-18s n %5d %12.3f us  ratio %5.2f\n", name, n, our * 1e6, our / their);
+    std::fflush(stdout);
+    ratios.add(our / their, "n " + std::to_string(n));
+}
+
+// A driver of LAPACK with its work space, found by a query.
+template <class Driver>
+std::vector<double> WorkFor(const Driver &driver) {
+    double size = 0.0;
+    driver(&size, -1);
+    return std::vector<double>(static_cast<std::size_t>(size));
+}
+
+const std::vector<int32_t> orders = {2, 4, 8, 16, 50, 100, 200, 500};
+
+void SingularValueDecomposition(bool withVectors) {
+    Ratios ratios(withVectors ? "singular value decompositions" : "singular values");
+    for (const int32_t n : orders) {
+        const std::vector<double> a = Random(n);
+        std::vector<double> u(a.size()), s(n), v(a.size()), copy;
+        const char job = withVectors ? 'S' : 'N';
+        const auto driver = [&](double *work, int32_t length) {
+            int32_t info;
+            LAPACK_dgesvd(&job, &job, &n, &n, copy.data(), &n, s.data(), u.data(), &n, v.data(), &n,
+                          work, &length, &info);
+        };
+        copy = a;
+        std::vector<double> work = WorkFor(driver);
+        Compare(
+            ratios, withVectors ? "svd" : "singular values", n,
+            [&] {
+                if (withVectors)
+                    qx::SVDecompose(a.data(), n, n, u.data(), s.data(), v.data(), 0);
+                else
+                    qx::SingularValues(a.data(), n, n, s.data());
+            },
+            [&] {
+                copy = a;
+                driver(work.data(), static_cast<int32_t>(work.size()));
+            });
+    }
+    ratios.summary("dgesvd");
+}
+
+void SymmetricEigenproblem() {
+    Ratios ratios("symmetric eigenproblems");
+    for (const int32_t n : orders) {
+        const std::vector<double> a = Symmetric(n, 0.0);
+        std::vector<double> w(n), v(a.size()), copy = a;
+        const auto driver = [&](double *work, int32_t length) {
+            int32_t info;
+            LAPACK_dsyev("V", "L", &n, copy.data(), &n, w.data(), work, &length, &info);
+        };
+        std::vector<double> work = WorkFor(driver);
+        Compare(
+            ratios, "symmetric", n, [&] { qx::SymmetricEigen(a.data(), n, 1, w.data(), v.data()); },
+            [&] {
+                copy = a;
+                driver(work.data(), static_cast<int32_t>(work.size()));
+            });
+    }
+    ratios.summary("dsyev");
+}
+
+void GeneralEigenproblem() {
+    Ratios ratios("general eigenproblems");
+    for (const int32_t n : orders) {
+        const std::vector<double> a = Random(n);
+        std::vector<CDB> w(n), vectors(a.size());
+        std::vector<double> re(n), im(n), v(a.size()), copy = a;
+        const auto driver = [&](double *work, int32_t length) {
+            int32_t info;
+            LAPACK_dgeev("N", "V", &n, copy.data(), &n, re.data(), im.data(), nullptr, &n, v.data(),
+                         &n, work, &length, &info);
+        };
+        std::vector<double> work = WorkFor(driver);
+        Compare(
+            ratios, "general", n,
+            [&] { qx::EigenGeneral(a.data(), n, 1, w.data(), vectors.data()); },
+            [&] {
+                copy = a;
+                driver(work.data(), static_cast<int32_t>(work.size()));
+            });
+    }
+    ratios.summary("dgeev");
+}
+
+void QR() {
+    Ratios ratios("QR factorisations with all of q");
+    for (const int32_t n : orders) {
+        const std::vector<double> a = Random(n);
+        std::vector<double> q(a.size()), r(a.size()), tau(n), copy = a;
+        const auto factor = [&](double *work, int32_t length) {
+            int32_t info;
+            LAPACK_dgeqrf(&n, &n, copy.data(), &n, tau.data(), work, &length, &info);
+        };
+        const auto form = [&](double *work, int32_t length) {
+            int32_t info;
+            LAPACK_dorgqr(&n, &n, &n, copy.data(), &n, tau.data(), work, &length, &info);
+        };
+        std::vector<double> work = WorkFor(factor), formWork = WorkFor(form);
+        Compare(
+            ratios, "qr", n,
+            [&] { qx::QRDecompose(a.data(), n, n, qx::qrFull, q.data(), r.data()); },
+            [&] {
+                copy = a;
+                factor(work.data(), static_cast<int32_t>(work.size()));
+                form(formWork.data(), static_cast<int32_t>(formWork.size()));
+            });
+    }
+    ratios.summary("dgeqrf and dorgqr");
+}
+
+void Cholesky() {
+    Ratios ratios("Cholesky factorisations");
+    for (const int32_t n : orders) {
+        const std::vector<double> a = Symmetric(n, n);
+        std::vector<double> packed, copy, work;
+        for (int32_t j = 0; j < n; ++j)
+            for (int32_t i = j; i < n; ++i)
+                packed.push_back(a[static_cast<std::size_t>(i) * n + j]);
+        Compare(
+            ratios, "cholesky", n,
+            [&] {
+                work = packed;
+                qx::PackedCholesky(work.data(), n);
+            },
+            [&] {
+                copy = a;
+                int32_t info;
+                LAPACK_dpotrf("L", &n, copy.data(), &n, &info);
+            });
+    }
+    ratios.summary("dpotrf");
+}
+
+} // namespace
+
+int main(int argc, char **argv) {
+    const qx::BlasMemory memory;
+    const std::pair<const char *, void (*)()> groups[] = {
+        {"svd", [] { SingularValueDecomposition(true); }},
+        {"values", [] { SingularValueDecomposition(false); }},
+        {"symmetric", SymmetricEigenproblem},
+        {"general", GeneralEigenproblem},
+        {"qr", QR},
+        {"cholesky", Cholesky}};
+    for (const auto &[name, run] : groups)
+        if (argc < 2 || std::find(argv + 1, argv + argc, std::string(name)) != argv + argc)
+            run();
+}
