@@ -168,8 +168,13 @@ void ExpectSchur(const Elements &elements, int n, int32_t order, Export schur) {
     for (int i = 0; i < n; ++i) {
         if (isComplex) {
             EXPECT_EQ(std::complex<long double>(w[i].re, w[i].im), T(i, i));
-        } else if (i + 1 < n && T(i + 1, i) == 0.0L) {
+        } else if (w[i].im == 0.0) {
             EXPECT_EQ(w[i].re, T(i, i).real());
+        } else if (i + 1 < n && T(i + 1, i) != 0.0L) {
+            EXPECT_GT(w[i].im, 0.0);
+            EXPECT_EQ(w[i + 1].im, -w[i].im);
+            EXPECT_NEAR(w[i].im * w[i].im, static_cast<double>(-(T(i + 1, i) * T(i, i + 1)).real()),
+                        1e-14 * w[i].im * w[i].im);
         }
     }
     for (int i = 0; order != 0 && i + 1 < n; ++i) {

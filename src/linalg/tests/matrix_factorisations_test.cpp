@@ -281,6 +281,11 @@ TEST(Cholesky, RefusesWhatIsNotPositiveDefinite) {
         EXPECT_EQ(err, ErrNotPositiveDefinite);
         EXPECT_EQ(a.size(), 0);
     }
+    // The factor is (1, 0; 2e7, 0.25): the last diagonal element is small beside the one left of
+    // it.
+    const DBLArray leaning(std::vector<double>{1.0, 2e7, 4e14 + 0.0625});
+    Cholesky_head(leaning.handle(), &err);
+    EXPECT_EQ(err, ErrNotPositiveDefinite);
     const DBLArray scaled(std::vector<double>{1.0, 0.0, 1e-15});
     Cholesky_head(scaled.handle(), &err);
     EXPECT_EQ(err, 0);
