@@ -104,6 +104,24 @@ TEST_P(Conformance, ValidArgumentsGiveOneResultEveryTime) {
     }
 }
 
+// A host that works in place: the result is that of two arrays.
+TEST_P(Conformance, OneArrayMayBeInputAndOutput) {
+    for (int32_t n : GetParam().sizes) {
+        Call probe(n);
+        const Result separate = run(probe);
+        for (const Call::Pair &pair : probe.pairsOfOneType()) {
+            SCOPED_TRACE(testing::Message()
+                         << n << ", input " << pair.input << " as output " << pair.output);
+            Call call(n);
+            call.share(pair);
+            const Result inPlace = run(call);
+            EXPECT_EQ(inPlace.status, separate.status);
+            EXPECT_EQ(inPlace.hash, separate.hash);
+            CheckBlocks();
+        }
+    }
+}
+
 TEST_P(Conformance, ARefusedResizeEmptiesEverything) {
     const int32_t n = GetParam().sizes.back();
     const int32_t reshapes = run(n).reshapes;

@@ -5,6 +5,7 @@
 #include <cmath>
 #include <cstring>
 #include <limits>
+#include <map>
 
 namespace qx::test {
 
@@ -164,6 +165,14 @@ double SomeReal(Random &random, const Sizes &sizes, bool isUsual) {
     default:
         return random.oneOf(usual);
     }
+}
+
+int32_t TypeCode(const std::string &element) {
+    static const std::map<std::string, int32_t> codes = {
+        {"I32", QXTypeI32}, {"U8", QXTypeU8},   {"U32", QXTypeU32}, {"SGL", QXTypeSGL},
+        {"DBL", QXTypeDBL}, {"CSG", QXTypeCSG}, {"CDB", QXTypeCDB}};
+    const auto found = codes.find(element);
+    return found == codes.end() ? 0 : found->second;
 }
 
 std::size_t ElementSize(const std::string &element) {

@@ -53,6 +53,8 @@ int32_t SomeWhole(Random &random, const Sizes &sizes);
 double SomeReal(Random &random, const Sizes &sizes, bool isUsual);
 
 std::size_t ElementSize(const std::string &element);
+// The host's, 0 for a record.
+int32_t TypeCode(const std::string &element);
 // rows by cols elements (a row of a 1-D array has them all), each field of a record by itself.
 std::vector<unsigned char> SomeElements(Random &random, const std::string &element, int32_t rows,
                                         int32_t cols, Content content);

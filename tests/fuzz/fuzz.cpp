@@ -295,8 +295,8 @@ private:
     static void *NewArray(const Parameter &parameter, const Argument &argument,
                           const unsigned char *rubbish) {
         const int32_t rows = parameter.dimensions() == 1 ? argument.cols : argument.rows;
-        void *handle = detail::NewBlock(parameter.dimensions(), ElementSize(parameter.element),
-                                        rows, argument.cols);
+        void *handle = detail::NewBlock(parameter.dimensions(), TypeCode(parameter.element),
+                                        ElementSize(parameter.element), rows, argument.cols);
         unsigned char *elements =
             *static_cast<unsigned char **>(handle) + 4 * parameter.dimensions();
         if (rubbish != nullptr)

@@ -24,6 +24,7 @@ struct Block {
     unsigned char *memory; // guard, header and elements, guard
     std::size_t size;      // header and elements
     int32_t numDims;
+    int32_t typeCode; // of its elements
     unsigned char *payload() const { return memory + guardSize; }
 };
 
@@ -39,7 +40,7 @@ Registry &Blocks() {
     return *registry;
 }
 
-Block Allocate(std::size_t size, int32_t numDims) {
+Block Allocate(std::size_t size, int32_t numDims, int32_t typeCode) {
     // 16-byte alignment of the payload puts elements of a 1-D block at 4 modulo 16.
     const std::size_t whole = (guardSize + size + guardSize + 15) / 16 * 16;
     auto *memory = static_cast<unsigned char *>(std::malloc(whole + 16));
@@ -48,7 +49,7 @@ Block Allocate(std::size_t size, int32_t numDims) {
     std::memset(memory, guardByte, guardSize);
     std::memset(memory + guardSize, Host().freshByte, size);
     std::memset(memory + guardSize + size, guardByte, guardSize);
-    return {memory, size, numDims};
+    return {memory, size, numDims, typeCode};
 }
 
 void Expect(const unsigned char *bytes, std::size_t count, unsigned char value, const char *what) {
@@ -90,6 +91,12 @@ std::size_t ElementSize(int32_t typeCode) {
         return 16;
     }
     throw std::logic_error("a reshape with an unknown type code");
+}
+
+// An array of DBL may be emptied, but not sized, as one of CDB: some transforms were written so.
+bool IsCodeOf(const Block &block, int32_t typeCode, int32_t count) {
+    return typeCode == block.typeCode ||
+           (count == 0 && block.typeCode == QXTypeDBL && typeCode == QXTypeCDB);
 }
 
 } // namespace
@@ -151,13 +158,14 @@ int LiveBlocks() {
 
 namespace detail {
 
-void *NewBlock(int32_t numDims, std::size_t elementSize, int32_t rows, int32_t cols) {
+void *NewBlock(int32_t numDims, int32_t typeCode, std::size_t elementSize, int32_t rows,
+               int32_t cols) {
     const HeapProbe::Pause pause;
     const std::lock_guard hold(Blocks().lock);
     const std::size_t count =
         static_cast<std::size_t>(rows) * (numDims == 2 ? static_cast<std::size_t>(cols) : 1);
     const Block block =
-        Allocate(4 * static_cast<std::size_t>(numDims) + count * elementSize, numDims);
+        Allocate(4 * static_cast<std::size_t>(numDims) + count * elementSize, numDims, typeCode);
     const int32_t sizes[2] = {rows, cols};
     std::memcpy(block.payload(), sizes, 4 * static_cast<std::size_t>(numDims));
     auto *handle = new void *(block.payload());
@@ -194,13 +202,15 @@ int32_t ReshapeBlock(int32_t typeCode, int32_t numDims, void *handleAddress, int
         throw std::logic_error("a reshape with another number of dimensions");
     if (count < 0)
         throw std::logic_error("a reshape to a negative count");
+    if (!IsCodeOf(found->second, typeCode, count))
+        throw std::logic_error("a reshape with the type code of another element");
     const uint64_t size =
         4 * static_cast<uint64_t>(numDims) + static_cast<uint64_t>(count) * ElementSize(typeCode);
     if (size > record.largestBlock)
         return statusNoMemory;
 
     const Block old = found->second;
-    const Block moved = Allocate(static_cast<std::size_t>(size), numDims);
+    const Block moved = Allocate(static_cast<std::size_t>(size), numDims, found->second.typeCode);
     std::memcpy(moved.payload(), old.payload(), old.size < moved.size ? old.size : moved.size);
     Quarantine(Blocks(), old);
     found->second = moved;

@@ -98,7 +98,9 @@ template <ElementType Code>
 using Handle2D = typename Handles<Code>::TwoD;
 
 namespace detail {
-void *NewBlock(int32_t numDims, std::size_t elementSize, int32_t rows, int32_t cols);
+// A block of records has the type code 0 and cannot be resized.
+void *NewBlock(int32_t numDims, int32_t typeCode, std::size_t elementSize, int32_t rows,
+               int32_t cols);
 void FreeBlock(void *handle);
 std::size_t BlockSize(void *handle); // sizes and elements
 int32_t ReshapeBlock(int32_t typeCode, int32_t numDims, void *handleAddress, int32_t count);
@@ -113,7 +115,8 @@ public:
     typedef typename Plain<Code>::type Value;
 
     explicit Array1D(int32_t n = 0)
-        : handle_(static_cast<Handle1D<Code>>(detail::NewBlock(1, sizeof(T), n, 0))) {}
+        : handle_(static_cast<Handle1D<Code>>(
+              detail::NewBlock(1, static_cast<int32_t>(Code), sizeof(T), n, 0))) {}
     Array1D(std::initializer_list<Value> values) : Array1D(static_cast<int32_t>(values.size())) {
         assign(values);
     }
@@ -126,6 +129,11 @@ public:
     Array1D &operator=(const Array1D &) = delete;
 
     Handle1D<Code> handle() const { return handle_; }
+    // As a host does it.
+    void resize(int32_t n) {
+        detail::ReshapeBlock(static_cast<int32_t>(Code), 1, &handle_, n);
+        (*handle_)->dimSize = n;
+    }
     int32_t size() const { return (*handle_)->dimSize; }
     T *data() const { return reinterpret_cast<T *>(*handle_ + 1); }
     // By value: a reference would bind to an address without the alignment of its type.
@@ -149,12 +157,18 @@ public:
     typedef typename Plain<Code>::type Value;
 
     Array2D(int32_t rows = 0, int32_t cols = 0)
-        : handle_(static_cast<Handle2D<Code>>(detail::NewBlock(2, sizeof(T), rows, cols))) {}
+        : handle_(static_cast<Handle2D<Code>>(
+              detail::NewBlock(2, static_cast<int32_t>(Code), sizeof(T), rows, cols))) {}
     ~Array2D() { detail::FreeBlock(handle_); }
     Array2D(const Array2D &) = delete;
     Array2D &operator=(const Array2D &) = delete;
 
     Handle2D<Code> handle() const { return handle_; }
+    void resize(int32_t rows, int32_t cols) {
+        detail::ReshapeBlock(static_cast<int32_t>(Code), 2, &handle_, rows * cols);
+        (*handle_)->dimSizes[0] = rows;
+        (*handle_)->dimSizes[1] = cols;
+    }
     int32_t rows() const { return (*handle_)->dimSizes[0]; }
     int32_t cols() const { return (*handle_)->dimSizes[1]; }
     int32_t size() const { return rows() * cols(); }

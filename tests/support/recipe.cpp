@@ -78,6 +78,7 @@ void *Call::makeRecords(int number, int32_t count, const void *records, std::siz
                     each);
     const U8_1D handle = array->array.handle();
     (*handle)->dimSize = stored;
+    array->isRecords = true;
     addInput(Role::Input, number, std::move(array));
     return handle;
 }
@@ -132,6 +133,20 @@ std::vector<Call::Size> Call::inputSizes() const {
             std::memcpy(&size, array->before.data() + 4 * i, sizeof size);
             found.push_back({number, static_cast<int>(i), size, mayBeZero});
         }
+    }
+    return found;
+}
+
+std::vector<Call::Pair> Call::pairsOfOneType() const {
+    std::vector<Pair> found;
+    for (const auto &[input, in] : inputs_) {
+        const bool isArgument =
+            !in->isRecords &&
+            std::find(insideRecord_.begin(), insideRecord_.end(), input) == insideRecord_.end();
+        for (const auto &[output, out] : outputs_)
+            if (isArgument && in->role == Role::Input && in->element() == out->element() &&
+                in->sizes().size() == out->sizes().size())
+                found.push_back({input, output});
     }
     return found;
 }

@@ -143,6 +143,12 @@ public:
         mayBeEmpty_.push_back(number);
     }
 
+    // An input that travels inside a record, so that no frame sees it beside an output.
+    void insideRecord(int number) {
+        const HeapProbe::Pause pause;
+        insideRecord_.push_back(number);
+    }
+
     // Scalar outputs: a failure leaves the quiet NaN, in both parts of a complex one, or for
     // integers 0.
     double *scalar(int number);
@@ -182,6 +188,13 @@ public:
     };
     std::vector<Size> inputSizes() const;
     void alter(int input, int dimension, int32_t size) { altered_ = {input, dimension, size}; }
+    // One array as the input and the output of these numbers: pairs of equal handle types.
+    struct Pair {
+        int input;
+        int output;
+    };
+    std::vector<Pair> pairsOfOneType() const;
+    void share(Pair pair) { shared_ = pair; }
     bool inputsAreUnchanged() const;
     // After a failure: arrays without elements, scalars NaN or 0, kept arrays as they were.
     bool outputsAreSettled() const;
@@ -197,11 +210,13 @@ private:
         virtual const unsigned char *block() const = 0; // sizes and elements
         virtual std::size_t blockSize() const = 0;
         virtual std::vector<int32_t> sizes() const = 0;
+        virtual ElementType element() const = 0;
         bool isUnchanged() const;
         bool isEmpty() const; // all its sizes are 0
         std::size_t headerSize() const { return 4 * sizes().size(); }
 
         Role role = Role::Output;
+        bool isRecords = false;
         std::vector<unsigned char> before; // content at the start, for inputs
     };
     template <ElementType Code>
@@ -222,6 +237,10 @@ private:
     void *makeRecords(int number, int32_t count, const void *records, std::size_t bytes);
     int32_t sizeOf(int number, int dimension, int32_t asked) const;
     void addInput(Role role, int number, std::unique_ptr<Array> array);
+    template <class Made, class... Sizes>
+    Made &sharedOutput(Sizes... sizes);
+    template <class Made, class... Sizes>
+    Made &addOutput(int number, Sizes... sizes);
 
     Arrays inputs_, outputs_;
     std::map<int, double> scalars_;
@@ -233,10 +252,11 @@ private:
     int32_t (*releaseInstance_)(void **) = nullptr;
     std::vector<std::unique_ptr<int32_t>> int32Values_;
     std::vector<std::unique_ptr<double>> doubleValues_;
-    std::vector<int> mayBeEmpty_;
+    std::vector<int> mayBeEmpty_, insideRecord_;
     ErrorCode error_ = 0;
     bool hasError_ = false;
     Alteration altered_ = {-1, 0, 0};
+    Pair shared_ = {-1, -1};
 };
 
 // What an export is known to do differently; everything else is checked.

@@ -71,6 +71,7 @@ struct Call::Array1 : Call::Array {
         return 4 + static_cast<std::size_t>(array.size()) * sizeof(typename Element<Code>::type);
     }
     std::vector<int32_t> sizes() const override { return {array.size()}; }
+    ElementType element() const override { return Code; }
 };
 
 template <ElementType Code>
@@ -84,12 +85,38 @@ struct Call::Array2 : Call::Array {
         return 8 + static_cast<std::size_t>(array.size()) * sizeof(typename Element<Code>::type);
     }
     std::vector<int32_t> sizes() const override { return {array.rows(), array.cols()}; }
+    ElementType element() const override { return Code; }
 };
+
+// The output that is shared with an input, in whichever order the two are asked for.
+template <class Made, class... Sizes>
+Made &Call::sharedOutput(Sizes... sizes) {
+    auto &held = outputs_[shared_.output];
+    if (!held)
+        held = std::make_unique<Made>(sizes...);
+    else
+        dynamic_cast<Made &>(*held).array.resize(sizes...);
+    return dynamic_cast<Made &>(*held);
+}
+
+template <class Made, class... Sizes>
+Made &Call::addOutput(int number, Sizes... sizes) {
+    auto &held = outputs_[number];
+    if (!held || number != shared_.output)
+        held = std::make_unique<Made>(sizes...);
+    return dynamic_cast<Made &>(*held);
+}
 
 template <ElementType Code, class Values>
 Handle1D<Code> Call::make(Role role, int number, int32_t count, const Values &values) {
     const HeapProbe::Pause pause;
-    auto array = std::make_unique<Array1<Code>>(sizeOf(number, 0, count));
+    const int32_t size = sizeOf(number, 0, count);
+    if (role == Role::Input && number == shared_.input) {
+        auto &array = sharedOutput<Array1<Code>>(size).array;
+        detail::Fill(array.data(), array.size(), 1, number, values);
+        return array.handle();
+    }
+    auto array = std::make_unique<Array1<Code>>(size);
     detail::Fill(array->array.data(), array->array.size(), 1, number, values);
     const Handle1D<Code> handle = array->array.handle();
     addInput(role, number, std::move(array));
@@ -99,7 +126,14 @@ Handle1D<Code> Call::make(Role role, int number, int32_t count, const Values &va
 template <ElementType Code, class Values>
 Handle2D<Code> Call::make(Role role, int number, int32_t rows, int32_t cols, const Values &values) {
     const HeapProbe::Pause pause;
-    auto array = std::make_unique<Array2<Code>>(sizeOf(number, 0, rows), sizeOf(number, 1, cols));
+    const int32_t first = sizeOf(number, 0, rows);
+    const int32_t second = sizeOf(number, 1, cols);
+    if (role == Role::Input && number == shared_.input) {
+        auto &array = sharedOutput<Array2<Code>>(first, second).array;
+        detail::Fill(array.data(), array.size(), array.cols(), number, values);
+        return array.handle();
+    }
+    auto array = std::make_unique<Array2<Code>>(first, second);
     detail::Fill(array->array.data(), array->array.size(), array->array.cols(), number, values);
     const Handle2D<Code> handle = array->array.handle();
     addInput(role, number, std::move(array));
@@ -109,19 +143,13 @@ Handle2D<Code> Call::make(Role role, int number, int32_t rows, int32_t cols, con
 template <ElementType Code>
 Handle1D<Code> Call::out(int number) {
     const HeapProbe::Pause pause;
-    auto array = std::make_unique<Array1<Code>>(3);
-    const Handle1D<Code> handle = array->array.handle();
-    outputs_[number] = std::move(array);
-    return handle;
+    return addOutput<Array1<Code>>(number, 3).array.handle();
 }
 
 template <ElementType Code>
 Handle2D<Code> Call::out2D(int number) {
     const HeapProbe::Pause pause;
-    auto array = std::make_unique<Array2<Code>>(1, 2);
-    const Handle2D<Code> handle = array->array.handle();
-    outputs_[number] = std::move(array);
-    return handle;
+    return addOutput<Array2<Code>>(number, 1, 2).array.handle();
 }
 
 } // namespace qx::test
