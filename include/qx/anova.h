@@ -19,8 +19,10 @@ QX_API int32_t Contingency_head(QX_IN I32_2D table, QX_OUT DBL *chiSquare, QX_OU
 
 /** One-way analysis of variance of y, whose element i belongs to the level labels[i], on *k levels:
     sums and means of squares between levels and within them (error), their ratio f and the
-    probability p of a larger one. Sums of squares are formed from a single pass, so a large mean
-    costs digits.
+    probability p of a larger one. Sums of squares are differences of large sums from a single pass,
+    so a large mean costs digits, and a sum that is 0 in truth, as the error of levels of equal
+    values or what lies between levels of equal means, may come out as a small number of either
+    sign: f is then infinite, huge or negative, and p 0 for a huge f, 1 for a negative one.
     Codes: ErrSizeMismatch (the lengths differ), ErrEmptyInput (y is empty), ErrAnovaFewLevels (k is
     below 2 or not below the number of observations), ErrOutOfMemory (no scratch memory),
     ErrAnovaFactorEmpty (more labels than k), ErrAnovaNoReplication (fewer),

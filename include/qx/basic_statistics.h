@@ -14,7 +14,8 @@ QX_BEGIN_DECLS
     Codes: ErrEmptyInput (x is empty). */
 QX_API int32_t Mean_head(QX_IN DBL1D x, QX_OUT DBL *mean, QX_OUT ErrorCode *err);
 
-/** Root mean square, sqrt(sum(x^2) / n). The squares may overflow.
+/** Root mean square, sqrt(sum(x^2) / n). The squares may overflow, and those of values below 1.5e-162
+    vanish, with digits lost up to 1e-154.
     Codes: ErrEmptyInput (x is empty). */
 QX_API int32_t RMS_head(QX_IN DBL1D x, QX_OUT DBL *rms, QX_OUT ErrorCode *err);
 

@@ -13,7 +13,8 @@ QX_BEGIN_DECLS
 /** A band of bins of a transform of length L = S N from S transforms of length N: out[i] = sum over
     u of x[u] exp(-2 pi i u (start + i) / L) for i from 0 to size-1, cyclic in frequency. An input
     shorter than L is zero-padded. A longer one is folded, in place: its elements from index N on
-    (not from L) are added, one after the other, to elements 0 to L-1 over and over.
+    (not from L) are added, one after the other, to elements 0 to L-1 over and over. Costs a
+    transform of length N and `size` rotations for each of min(S, elements of x) sub-sequences.
     Codes: ErrOrderNotPositive (S below 1), ErrFFTSizeNotPositive (size or N below 1),
     ErrOutOfMemory (no memory), the host's status, ErrLengthTooLarge (an index would pass int32). A
     negative status empties out. An empty input gives an empty output and 0. */

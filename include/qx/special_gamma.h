@@ -12,8 +12,9 @@ QX_BEGIN_DECLS
 /** Beta function. Complete where x is NaN: B(a, b) = gamma(a) gamma(b) / gamma(a + b), NaN for
     arguments that are not finite and at poles of gamma. Otherwise the regularised incomplete beta
     function I_x(a, b): the integral of t^(a-1) (1 - t)^(b-1) from 0 to x over B(a, b), by continued
-    fractions (26.5.8 and 26.5.9) that are cut after 100 terms; NaN for a < 0, b < 0, x outside
-    [0, 1] or an argument that is not finite. */
+    fractions (26.5.8 and 26.5.9) that are cut after 100 terms, which costs up to 1e7 eps with a and
+    b in the thousands; for 0 < x < 1 its limit 1 at a = 0 and 0 at b = 0, NaN where both are; NaN
+    for a < 0, b < 0, x outside [0, 1] or an argument that is not finite. */
 QX_API void QX_Beta(double a, double b, double x, QX_OUT DBL *value);
 
 /** As QX_Beta, with a selector for what a NaN says there: 1 complete, otherwise I_x(a, b). */

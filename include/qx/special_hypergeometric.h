@@ -24,7 +24,8 @@ QX_BEGIN_DECLS
     NaN where an argument is NaN or infinite, |x| > 1, or x = 1 and c <= a + b; +infinity where c is
     0, -1, -2, ... and the series does not end before. The limit form is summed to 1.8e-11; both
     forms in 1 - x lose digits like x^(1-c) where c is large and x below 0.5, and where an infinity
-    arises within them they give NaN. */
+    arises within them they give NaN. Series that end are summed in their order, whose terms
+    alternate for x > 0: beyond 32 of them, or with parameters beyond 40, no digit may be left. */
 QX_API void QX_Gauss(double x, double a, double b, double c, QX_OUT DBL *value);
 
 /** As QX_Gauss, with Pfaff's transformation for all x < 0.2, where its argument lies in [-0.25,
@@ -39,7 +40,8 @@ QX_API void QX_Gauss_2011(double x, double a, double b, double c, QX_OUT DBL *va
     (b - 2 a) x > 0, the expansion in Bessel functions (13.3.7), at most 300 terms, to 2.2e-14; the
     power series, to 8.9e-16, in doubled precision where its terms cancel; the asymptotic form.
     Failing these, the series if its error is no larger than the asymptotic form's or below 1.2e-4,
-    the asymptotic form if its error is below 1.2e-4, else NaN.
+    the asymptotic form if its error is below 1.2e-4, else NaN. Weak for x from -100 to -25 with a
+    up to 30: few digits or NaN.
 
     exp(x) for a and b both infinite or equal; 1 for a = 0 and for x = 0; +infinity at x = +infinity
     for finite a and b; NaN for a NaN, for a and x both infinite, for b = 0, -1, -2, ... unless the

@@ -19,26 +19,31 @@ struct ComplexData {
     const DBL *inRe, *inIm;
     DBL *outRe, *outIm;
     ptrdiff_t inStride, outStride;
+    DBL *work;
 
     // The part that begins `in` inputs and `out` results behind, with every p-th input.
     ComplexData part(ptrdiff_t in, ptrdiff_t out, ptrdiff_t p) const {
-        return {inRe + in * inStride,    inIm + in * inStride, outRe + out * outStride,
-                outIm + out * outStride, p * inStride,         outStride};
+        return {inRe + in * inStride,
+                inIm + in * inStride,
+                outRe + out * outStride,
+                outIm + out * outStride,
+                p * inStride,
+                outStride,
+                work};
     }
-    ErrorCode leaf(const FFTPlan &plan, int32_t count) const {
+    void leaf(const FFTPlan &plan, int32_t count) const {
         const int32_t last = plan.factorCount - 1;
         if (plan.kinds[last] != KernelFactor)
-            return PrimeComplexLeaf(PrimeAt(plan, last), inRe, inIm, outRe, outIm, inStride,
-                                    outStride, count);
-        plan.complexLeaf[last](inRe, inIm, outRe, outIm, inStride, outStride, count);
-        return 0;
+            PrimeComplexLeaf(PrimeAt(plan, last), inRe, inIm, outRe, outIm, inStride, outStride,
+                             count, work);
+        else
+            plan.complexLeaf[last](inRe, inIm, outRe, outIm, inStride, outStride, count);
     }
-    ErrorCode twiddle(const FFTPlan &plan, int32_t level, int32_t m) const {
+    void twiddle(const FFTPlan &plan, int32_t level, int32_t m) const {
         if (plan.kinds[level] != KernelFactor)
-            return PrimeComplexTwiddle(PrimeAt(plan, level), outRe, outIm, outStride, m);
+            return PrimeComplexTwiddle(PrimeAt(plan, level), outRe, outIm, outStride, m, work);
         const FFTStage &stage = *plan.stages[level];
         plan.complexTwiddle[level](outRe, outIm, stage.twiddleCos, stage.twiddleSin, outStride, m);
-        return 0;
     }
 };
 
@@ -46,26 +51,26 @@ struct RealData {
     const DBL *in;
     DBL *out;
     ptrdiff_t inStride, outStride;
+    DBL *work;
 
     RealData part(ptrdiff_t inputs, ptrdiff_t results, ptrdiff_t p) const {
-        return {in + inputs * inStride, out + results * outStride, p * inStride, outStride};
+        return {in + inputs * inStride, out + results * outStride, p * inStride, outStride, work};
     }
-    ErrorCode leaf(const FFTPlan &plan, int32_t count) const {
+    void leaf(const FFTPlan &plan, int32_t count) const {
         const int32_t last = plan.factorCount - 1;
         if (plan.kinds[last] != KernelFactor)
-            return PrimeRealLeaf(PrimeAt(plan, last), in, out, inStride, outStride, count);
-        plan.realLeaf[last](in, out, inStride, outStride, count);
-        return 0;
+            PrimeRealLeaf(PrimeAt(plan, last), in, out, inStride, outStride, count, work);
+        else
+            plan.realLeaf[last](in, out, inStride, outStride, count);
     }
-    ErrorCode twiddle(const FFTPlan &plan, int32_t level, int32_t m) const {
+    void twiddle(const FFTPlan &plan, int32_t level, int32_t m) const {
         if (plan.kinds[level] != KernelFactor)
-            return PrimeRealTwiddle(PrimeAt(plan, level), out, outStride, m);
+            return PrimeRealTwiddle(PrimeAt(plan, level), out, outStride, m, work);
         const FFTStage &stage = *plan.stages[level];
         if (outStride == 1)
             stage.kernels->realLanesTwiddle(out, stage, m);
         else
             plan.realTwiddle[level](out, stage.twiddleCos, stage.twiddleSin, outStride, m);
-        return 0;
     }
 };
 
@@ -73,17 +78,16 @@ struct RealData {
 // p-th value, one behind the other, and then the twiddle stage over all of them. The leaf takes the
 // p transforms of the last level but one at once.
 template <class Data>
-ErrorCode Recurse(const FFTPlan &plan, int32_t level, int32_t n, const Data &data) {
+void Recurse(const FFTPlan &plan, int32_t level, int32_t n, const Data &data) {
     const int32_t p = plan.factors[level];
     const int32_t m = n / p;
-    ErrorCode status = 0;
     if (level == plan.factorCount - 2) {
-        status = data.leaf(plan, p);
+        data.leaf(plan, p);
     } else {
-        for (ptrdiff_t j = 0; j < p && status >= 0; ++j)
-            status = Recurse(plan, level + 1, m, data.part(j, j * m, p));
+        for (ptrdiff_t j = 0; j < p; ++j)
+            Recurse(plan, level + 1, m, data.part(j, j * m, p));
     }
-    return status < 0 ? status : data.twiddle(plan, level, m);
+    data.twiddle(plan, level, m);
 }
 
 // The recursion in SIMD lanes, for results that lie side by side and a leaf with kernels. Several
@@ -102,12 +106,11 @@ struct ComplexLanesPath {
                      const LeafColumns &columns) {
         kernels.complexLanesLeaf(in, out, columns);
     }
-    static ErrorCode twiddle(const FFTPlan &plan, int32_t level, DBL *out, int32_t m) {
+    static void twiddle(const FFTPlan &plan, int32_t level, DBL *out, int32_t m, DBL *work) {
         if (plan.kinds[level] != KernelFactor)
-            return PrimeComplexTwiddle(PrimeAt(plan, level), out, out + 1, 2, m);
+            return PrimeComplexTwiddle(PrimeAt(plan, level), out, out + 1, 2, m, work);
         const FFTStage &stage = *plan.stages[level];
         stage.kernels->complexLanesTwiddle(out, stage, m);
-        return 0;
     }
 };
 struct RealLanesPath {
@@ -116,18 +119,17 @@ struct RealLanesPath {
                      const LeafColumns &columns) {
         kernels.realLanesLeaf(in, out, columns);
     }
-    static ErrorCode twiddle(const FFTPlan &plan, int32_t level, DBL *out, int32_t m) {
-        return RealData{nullptr, out, 1, 1}.twiddle(plan, level, m);
+    static void twiddle(const FFTPlan &plan, int32_t level, DBL *out, int32_t m, DBL *work) {
+        RealData{nullptr, out, 1, 1, work}.twiddle(plan, level, m);
     }
 };
 
 template <class Path>
-ErrorCode RecurseLanes(const FFTPlan &plan, int32_t level, int32_t n, const DBL *in, DBL *out,
-                       ptrdiff_t inStride, const Bundle &bundle) {
+void RecurseLanes(const FFTPlan &plan, int32_t level, int32_t n, const DBL *in, DBL *out,
+                  ptrdiff_t inStride, const Bundle &bundle, DBL *work) {
     const int32_t p = plan.factors[level];
     const int32_t m = n / p;
     const ptrdiff_t block = m * Path::width;
-    ErrorCode status = 0;
     if (level == plan.factorCount - 2) {
         const KernelSet &kernels = *plan.stages[level + 1]->kernels;
         if (bundle.count == 1)
@@ -139,18 +141,16 @@ ErrorCode RecurseLanes(const FFTPlan &plan, int32_t level, int32_t n, const DBL 
                         {bundle.outStride, block},
                         p * inStride});
     } else if (bundle.count > 1) {
-        for (ptrdiff_t j = 0; j < p && status >= 0; ++j)
-            status = RecurseLanes<Path>(plan, level + 1, m, in + j * inStride, out + j * block,
-                                        p * inStride, bundle);
+        for (ptrdiff_t j = 0; j < p; ++j)
+            RecurseLanes<Path>(plan, level + 1, m, in + j * inStride, out + j * block, p * inStride,
+                               bundle, work);
     } else {
-        for (ptrdiff_t j = 0; j < p && status >= 0; j += leafBundle)
-            status = RecurseLanes<Path>(plan, level + 1, m, in + j * inStride, out + j * block,
-                                        p * inStride,
-                                        {std::min<ptrdiff_t>(leafBundle, p - j), inStride, block});
+        for (ptrdiff_t j = 0; j < p; j += leafBundle)
+            RecurseLanes<Path>(plan, level + 1, m, in + j * inStride, out + j * block, p * inStride,
+                               {std::min<ptrdiff_t>(leafBundle, p - j), inStride, block}, work);
     }
-    for (ptrdiff_t b = 0; b < bundle.count && status >= 0; ++b)
-        status = Path::twiddle(plan, level, out + b * bundle.outStride, m);
-    return status;
+    for (ptrdiff_t b = 0; b < bundle.count; ++b)
+        Path::twiddle(plan, level, out + b * bundle.outStride, m, work);
 }
 
 bool LeafHasKernels(const FFTPlan &plan) {
@@ -195,62 +195,64 @@ void MirrorSums(DBL *values, ptrdiff_t stride, ptrdiff_t n) {
 
 } // namespace
 
-ErrorCode ExecuteComplex(const FFTPlan &plan, const DBL *inRe, const DBL *inIm, DBL *outRe,
-                         DBL *outIm, ptrdiff_t inStride, ptrdiff_t outStride) {
+void ExecuteComplex(const FFTPlan &plan, const DBL *inRe, const DBL *inIm, DBL *outRe, DBL *outIm,
+                    ptrdiff_t inStride, ptrdiff_t outStride, DBL *work) {
     const bool interleaved = inIm == inRe + 1 && outIm == outRe + 1 && outStride == 2;
     if (plan.whole.complex != nullptr) {
         if (interleaved && inStride == 2)
             plan.whole.complex(inRe, outRe);
         else
             WholeComplex(plan, inRe, inIm, outRe, outIm, inStride, outStride);
-        return 0;
+        return;
     }
     if (plan.factorCount == 0) {
         outRe[0] = inRe[0];
         outIm[0] = inIm[0];
-        return 0;
+        return;
     }
-    const ComplexData data{inRe, inIm, outRe, outIm, inStride, outStride};
+    const ComplexData data{inRe, inIm, outRe, outIm, inStride, outStride, work};
     if (plan.factorCount == 1)
         return data.leaf(plan, 1);
     if (interleaved && LeafHasKernels(plan))
         return RecurseLanes<ComplexLanesPath>(plan, 0, plan.length, inRe, outRe, inStride,
-                                              {1, 0, 0});
-    return Recurse(plan, 0, plan.length, data);
+                                              {1, 0, 0}, work);
+    Recurse(plan, 0, plan.length, data);
 }
 
-ErrorCode ExecuteReal(const FFTPlan &plan, const DBL *in, DBL *out, ptrdiff_t inStride,
-                      ptrdiff_t outStride) {
+void ExecuteReal(const FFTPlan &plan, const DBL *in, DBL *out, ptrdiff_t inStride,
+                 ptrdiff_t outStride, DBL *work) {
     if (plan.whole.real != nullptr) {
         if (inStride == 1 && outStride == 1)
             plan.whole.real(in, out);
         else
             WholeReal(plan, in, out, inStride, outStride);
-        return 0;
+        return;
     }
     if (plan.factorCount == 0) {
         out[0] = in[0];
-        return 0;
+        return;
     }
-    const RealData data{in, out, inStride, outStride};
+    const RealData data{in, out, inStride, outStride, work};
     if (plan.factorCount == 1)
         return data.leaf(plan, 1);
     if (outStride == 1 && LeafHasKernels(plan))
-        return RecurseLanes<RealLanesPath>(plan, 0, plan.length, in, out, inStride, {1, 0, 0});
-    return Recurse(plan, 0, plan.length, data);
+        return RecurseLanes<RealLanesPath>(plan, 0, plan.length, in, out, inStride, {1, 0, 0},
+                                           work);
+    Recurse(plan, 0, plan.length, data);
 }
 
 ErrorCode FFTComplexForward(const FFTPlan *plan, const DBL *inRe, const DBL *inIm, DBL *outRe,
-                            DBL *outIm, int32_t inStride, int32_t outStride, int32_t n) {
+                            DBL *outIm, int32_t inStride, int32_t outStride, int32_t n, DBL *work) {
     if (n != plan->length)
         return -1; // kept: the real operations report ErrInternal here
-    return ExecuteComplex(*plan, inRe, inIm, outRe, outIm, inStride, outStride);
+    ExecuteComplex(*plan, inRe, inIm, outRe, outIm, inStride, outStride, work);
+    return 0;
 }
 
 ErrorCode FFTComplexInverse(const FFTPlan *plan, const DBL *inRe, const DBL *inIm, DBL *outRe,
-                            DBL *outIm, int32_t inStride, int32_t outStride, int32_t n) {
+                            DBL *outIm, int32_t inStride, int32_t outStride, int32_t n, DBL *work) {
     const ErrorCode status =
-        FFTComplexForward(plan, inRe, inIm, outRe, outIm, inStride, outStride, n);
+        FFTComplexForward(plan, inRe, inIm, outRe, outIm, inStride, outStride, n, work);
     if (status < 0)
         return status;
     const double scale = 1.0 / n;
@@ -272,25 +274,59 @@ ErrorCode FFTComplexInverse(const FFTPlan *plan, const DBL *inRe, const DBL *inI
 }
 
 ErrorCode FFTRealForward(const FFTPlan *plan, const DBL *in, DBL *out, int32_t inStride,
-                         int32_t outStride, int32_t n) {
+                         int32_t outStride, int32_t n, DBL *work) {
     if (n != plan->length)
         return ErrInternal;
-    return ExecuteReal(*plan, in, out, inStride, outStride);
+    ExecuteReal(*plan, in, out, inStride, outStride, work);
+    return 0;
 }
 
 ErrorCode FFTRealInverse(const FFTPlan *plan, DBL *in, DBL *out, int32_t inStride,
-                         int32_t outStride, int32_t n) {
+                         int32_t outStride, int32_t n, DBL *work) {
     if (n != plan->length)
         return ErrInternal;
     const double scale = 1.0 / n;
     for (ptrdiff_t k = 0; k < n; ++k)
         in[k * inStride] *= scale;
     MirrorSums(in, inStride, n);
-    const ErrorCode status = ExecuteReal(*plan, in, out, inStride, outStride);
-    if (status < 0 || n < 3)
-        return status;
-    MirrorSums(out, outStride, n);
-    return status;
+    ExecuteReal(*plan, in, out, inStride, outStride, work);
+    if (n > 2)
+        MirrorSums(out, outStride, n);
+    return 0;
+}
+
+// The same with work memory of their own.
+
+ErrorCode FFTComplexForward(const FFTPlan *plan, const DBL *inRe, const DBL *inIm, DBL *outRe,
+                            DBL *outIm, int32_t inStride, int32_t outStride, int32_t n) {
+    TransformWork work;
+    if (const ErrorCode failed = work.take(plan->complexWork))
+        return failed;
+    return FFTComplexForward(plan, inRe, inIm, outRe, outIm, inStride, outStride, n, work.data());
+}
+
+ErrorCode FFTComplexInverse(const FFTPlan *plan, const DBL *inRe, const DBL *inIm, DBL *outRe,
+                            DBL *outIm, int32_t inStride, int32_t outStride, int32_t n) {
+    TransformWork work;
+    if (const ErrorCode failed = work.take(plan->complexWork))
+        return failed;
+    return FFTComplexInverse(plan, inRe, inIm, outRe, outIm, inStride, outStride, n, work.data());
+}
+
+ErrorCode FFTRealForward(const FFTPlan *plan, const DBL *in, DBL *out, int32_t inStride,
+                         int32_t outStride, int32_t n) {
+    TransformWork work;
+    if (const ErrorCode failed = work.take(plan->realWork))
+        return failed;
+    return FFTRealForward(plan, in, out, inStride, outStride, n, work.data());
+}
+
+ErrorCode FFTRealInverse(const FFTPlan *plan, DBL *in, DBL *out, int32_t inStride,
+                         int32_t outStride, int32_t n) {
+    TransformWork work;
+    if (const ErrorCode failed = work.take(plan->realWork))
+        return failed;
+    return FFTRealInverse(plan, in, out, inStride, outStride, n, work.data());
 }
 
 } // namespace qx

@@ -7,12 +7,13 @@
 
 namespace qx {
 
-// The forward transforms of a plan's own length. Inside the engine strides are as wide as
+// The forward transforms of a plan's own length, with work memory of the plan's complexWork or
+// realWork values: they cannot fail. Inside the engine strides are as wide as
 // addresses: those of inner stages are products of lengths.
-ErrorCode ExecuteComplex(const FFTPlan &plan, const DBL *inRe, const DBL *inIm, DBL *outRe,
-                         DBL *outIm, std::ptrdiff_t inStride, std::ptrdiff_t outStride);
-ErrorCode ExecuteReal(const FFTPlan &plan, const DBL *in, DBL *out, std::ptrdiff_t inStride,
-                      std::ptrdiff_t outStride);
+void ExecuteComplex(const FFTPlan &plan, const DBL *inRe, const DBL *inIm, DBL *outRe, DBL *outIm,
+                    std::ptrdiff_t inStride, std::ptrdiff_t outStride, DBL *work);
+void ExecuteReal(const FFTPlan &plan, const DBL *in, DBL *out, std::ptrdiff_t inStride,
+                 std::ptrdiff_t outStride, DBL *work);
 
 } // namespace qx
 

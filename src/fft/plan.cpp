@@ -3,10 +3,12 @@
 #include "fft/execute.h"
 #include "fft/factorise.h"
 #include "fft/kernels/kernels.h"
+#include "fft/prime_stages.h"
 #include "frame/constants.h"
 #include "frame/elements.h"
 #include "frame/platform.h"
 
+#include <algorithm>
 #include <cmath>
 #include <cstddef>
 #include <cstdlib>
@@ -159,8 +161,11 @@ void BuildRaderOrders(FFTStage *stage, int32_t p) {
 // the orders wraps around as it does without padding.
 bool BuildRaderSpectrum(FFTStage *stage, int32_t p, int32_t n) {
     DBL *temporary = nullptr;
-    if (!Allocate(temporary, 2 * int64_t{n}))
+    DBL *work = nullptr;
+    if (!Allocate(temporary, 2 * int64_t{n}) || !Allocate(work, stage->raderPlan->complexWork)) {
+        std::free(temporary);
         return false;
+    }
     Fill(temporary, 2 * ptrdiff_t{n}, 0.0);
     Roots roots(kTwoPi / p);
     for (int32_t t = 0; t < p - 1; ++t) {
@@ -175,10 +180,11 @@ bool BuildRaderSpectrum(FFTStage *stage, int32_t p, int32_t n) {
         temporary[i] = temporary[wrapped] = stage->raderCos[root] * scale;
         temporary[n + i] = temporary[n + wrapped] = stage->raderSin[root] * scale;
     }
-    const ErrorCode status = ExecuteComplex(*stage->raderPlan, temporary, temporary + n,
-                                            stage->raderCos, stage->raderSin, 1, 1);
+    ExecuteComplex(*stage->raderPlan, temporary, temporary + n, stage->raderCos, stage->raderSin, 1,
+                   1, work);
+    std::free(work);
     std::free(temporary);
-    return status == 0;
+    return true;
 }
 
 bool BuildRader(FFTStage *stage, int32_t p) {
@@ -213,6 +219,17 @@ bool BuildStages(FFTPlan *plan) {
         n /= p;
     }
     return true;
+}
+
+void MeasureWork(FFTPlan *plan) {
+    for (int32_t s = 0; s < plan->factorCount; ++s) {
+        if (plan->kinds[s] == KernelFactor)
+            continue;
+        const bool isLeaf = s == plan->factorCount - 1;
+        const PrimeFactor factor = {plan->factors[s], plan->kinds[s], plan->stages[s]};
+        plan->complexWork = std::max(plan->complexWork, PrimeComplexWork(factor, isLeaf));
+        plan->realWork = std::max(plan->realWork, PrimeRealWork(factor, isLeaf));
+    }
 }
 
 void FillKernels(FFTPlan *plan) {
@@ -252,10 +269,12 @@ FFTPlan *Build(int32_t length) {
     plan->length = length;
     Factorise(plan);
     FillKernels(plan);
-    if (BuildStages(plan))
-        return plan;
-    Dismantle(plan);
-    return nullptr;
+    if (!BuildStages(plan)) {
+        Dismantle(plan);
+        return nullptr;
+    }
+    MeasureWork(plan);
+    return plan;
 }
 
 // The next three run under the mutex.

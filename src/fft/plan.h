@@ -1,6 +1,7 @@
 #ifndef QX_FFT_PLAN_H
 #define QX_FFT_PLAN_H
 
+#include "frame/scratch.h"
 #include "qx/errors.h"
 #include "qx/fft.h"
 #include "qx/types.h"
@@ -83,6 +84,10 @@ struct FFTPlan {
     // would cost more than the arithmetic.
     qx::WholeTransform whole;
 
+    // The work memory of a transform of complex and of real data, in values; 0 unless a Rader
+    // prime is among the factors.
+    int64_t complexWork, realWork;
+
     // Twiddles of the cosine transforms, built by QuarterWave at its first call; else null.
     mutable std::atomic<const double *> quarterWave;
 };
@@ -98,8 +103,8 @@ void destroy_oxfft_table(FFTPlan *plan);
 // the opposite sign and the factor 1/n. Input and output are different memory; strides count in
 // DBL units, so interleaved complex data has stride 2. Any number of threads may share a plan.
 //
-// ErrOutOfMemory: scratch memory for a prime factor without a kernel; the output is incomplete.
-// A plan of another length gives -1.
+// ErrOutOfMemory: scratch memory for a prime from 53 on; the output is then as it was. A plan of
+// another length gives -1.
 ErrorCode FFTComplexForward(const FFTPlan *plan, const DBL *inRe, const DBL *inIm, DBL *outRe,
                             DBL *outIm, int32_t inStride, int32_t outStride, int32_t n);
 ErrorCode FFTComplexInverse(const FFTPlan *plan, const DBL *inRe, const DBL *inIm, DBL *outRe,
@@ -112,6 +117,27 @@ ErrorCode FFTRealForward(const FFTPlan *plan, const DBL *in, DBL *out, int32_t i
                          int32_t outStride, int32_t n);
 ErrorCode FFTRealInverse(const FFTPlan *plan, DBL *in, DBL *out, int32_t inStride,
                          int32_t outStride, int32_t n);
+
+// The work memory of transforms, for callers that run many of one length: the plan's complexWork
+// or realWork values, or more. No scratch memory is asked for where these are 0.
+class TransformWork {
+public:
+    ErrorCode take(int64_t values) { return values == 0 ? 0 : memory_.allocate(values); }
+    DBL *data() const { return memory_.data(); }
+
+private:
+    Scratch<ElementType::DBL> memory_;
+};
+
+// The same four in that memory. They have no failure but a plan of another length.
+ErrorCode FFTComplexForward(const FFTPlan *plan, const DBL *inRe, const DBL *inIm, DBL *outRe,
+                            DBL *outIm, int32_t inStride, int32_t outStride, int32_t n, DBL *work);
+ErrorCode FFTComplexInverse(const FFTPlan *plan, const DBL *inRe, const DBL *inIm, DBL *outRe,
+                            DBL *outIm, int32_t inStride, int32_t outStride, int32_t n, DBL *work);
+ErrorCode FFTRealForward(const FFTPlan *plan, const DBL *in, DBL *out, int32_t inStride,
+                         int32_t outStride, int32_t n, DBL *work);
+ErrorCode FFTRealInverse(const FFTPlan *plan, DBL *in, DBL *out, int32_t inStride,
+                         int32_t outStride, int32_t n, DBL *work);
 
 // A plan held for the scope.
 class PlanReference {

@@ -3,7 +3,6 @@
 #include "fft/execute.h"
 #include "frame/elements.h"
 #include "frame/lanes.h"
-#include "frame/scratch.h"
 
 #include <algorithm>
 #include <cstddef>
@@ -37,20 +36,22 @@ Output Interleaved(DBL *values) { return {values, values + 1, 2}; }
 
 // The p-point transforms. They gather their input into `work` first, so they may work in place.
 
-// The values of work that each of them takes. A padded convolution has its spectrum in work too.
-bool IsPadded(const PrimeFactor &factor) {
-    return factor.kind == RaderPrime && factor.stage->raderPlan->length != factor.p - 1;
-}
-int64_t ComplexWork(const PrimeFactor &factor) {
+// A padded convolution has its spectrum in work too.
+bool IsPadded(const PrimeFactor &factor) { return factor.stage->raderPlan->length != factor.p - 1; }
+
+// The values of work that a transform by Rader's algorithm takes for itself. That of the
+// transforms of its convolution stands behind them.
+int64_t RaderComplexWork(const PrimeFactor &factor) {
     return IsPadded(factor) ? 4 * int64_t{factor.stage->raderPlan->length} : 2 * int64_t{factor.p};
 }
-int64_t RealWork(const PrimeFactor &factor) {
-    if (factor.kind == DirectPrime)
-        return factor.p;
-    return IsPadded(factor) ? 4 * int64_t{factor.stage->raderPlan->length} : 4 * int64_t{factor.p};
+int64_t RaderRealWork(const PrimeFactor &factor) {
+    return 4 * int64_t{factor.stage->raderPlan->length};
 }
 
-ErrorCode DirectComplex(const PrimeFactor &factor, Input x, Output y, DBL *work) {
+// A plain sum works on the stack: a column of complex values, and as much again.
+constexpr ptrdiff_t directWork = 4 * 47;
+
+void DirectComplex(const PrimeFactor &factor, Input x, Output y, DBL *work) {
     const ptrdiff_t p = factor.p;
     const ptrdiff_t h = p / 2;
     const DBL *const rootCos = factor.stage->rootCos;
@@ -89,11 +90,10 @@ ErrorCode DirectComplex(const PrimeFactor &factor, Input x, Output y, DBL *work)
             y.set(p - frequencies[which], mirrored[which]);
         }
     }
-    return 0;
 }
 
-ErrorCode DirectReal(const PrimeFactor &factor, const DBL *x, ptrdiff_t inStride, DBL *y,
-                     ptrdiff_t outStride, DBL *work) {
+void DirectReal(const PrimeFactor &factor, const DBL *x, ptrdiff_t inStride, DBL *y,
+                ptrdiff_t outStride, DBL *work) {
     const ptrdiff_t p = factor.p;
     const ptrdiff_t h = p / 2;
     const double x0 = x[0];
@@ -118,7 +118,6 @@ ErrorCode DirectReal(const PrimeFactor &factor, const DBL *x, ptrdiff_t inStride
         y[q * outStride] = re;
         y[(p - q) * outStride] = im;
     }
-    return 0;
 }
 
 // Multiplies value k of the spectrum by that of the roots and conjugates it: together with the
@@ -129,7 +128,7 @@ void SetConjugateProduct(const FFTStage &stage, ptrdiff_t k, double a, double b,
     y.set(k, c * a - s * b, -(a * s) - c * b);
 }
 
-ErrorCode RaderComplex(const PrimeFactor &factor, Input x, Output y, DBL *work) {
+void RaderComplex(const PrimeFactor &factor, Input x, Output y, DBL *work) {
     const FFTStage &stage = *factor.stage;
     const FFTPlan &plan = *stage.raderPlan;
     const ptrdiff_t p = factor.p;
@@ -137,6 +136,7 @@ ErrorCode RaderComplex(const PrimeFactor &factor, Input x, Output y, DBL *work) 
     const Output gathered = Interleaved(work);
     const Output spectrum = IsPadded(factor) ? Interleaved(work + 2 * n)
                                              : Output{y.re + y.stride, y.im + y.stride, y.stride};
+    DBL *const inner = work + RaderComplexWork(factor);
     const double x0Re = x.re[0];
     const double x0Im = x.im[0];
     double sumRe = x0Re;
@@ -149,25 +149,20 @@ ErrorCode RaderComplex(const PrimeFactor &factor, Input x, Output y, DBL *work) 
     }
     Fill(work + 2 * (p - 1), 2 * (n - (p - 1)), 0.0);
     y.set(0, sumRe, sumIm);
-    ErrorCode status = ExecuteComplex(plan, gathered.re, gathered.im, spectrum.re, spectrum.im, 2,
-                                      spectrum.stride);
-    if (status < 0)
-        return status;
+    ExecuteComplex(plan, gathered.re, gathered.im, spectrum.re, spectrum.im, 2, spectrum.stride,
+                   inner);
     for (ptrdiff_t k = 0; k < n; ++k)
         SetConjugateProduct(stage, k, spectrum.re[k * spectrum.stride],
                             spectrum.im[k * spectrum.stride], spectrum);
-    status = ExecuteComplex(plan, spectrum.re, spectrum.im, gathered.re, gathered.im,
-                            spectrum.stride, 2);
-    if (status < 0)
-        return status;
+    ExecuteComplex(plan, spectrum.re, spectrum.im, gathered.re, gathered.im, spectrum.stride, 2,
+                   inner);
     for (ptrdiff_t i = 1; i < p; ++i)
         y.set(stage.raderScatter[i], x0Re + work[2 * i - 2], x0Im - work[2 * i - 1]);
-    return 0;
 }
 
 // The length of a convolution is even, padded or not.
-ErrorCode RaderReal(const PrimeFactor &factor, const DBL *x, ptrdiff_t inStride, DBL *y,
-                    ptrdiff_t outStride, DBL *work) {
+void RaderReal(const PrimeFactor &factor, const DBL *x, ptrdiff_t inStride, DBL *y,
+               ptrdiff_t outStride, DBL *work) {
     const FFTStage &stage = *factor.stage;
     const FFTPlan &plan = *stage.raderPlan;
     const ptrdiff_t p = factor.p;
@@ -175,6 +170,7 @@ ErrorCode RaderReal(const PrimeFactor &factor, const DBL *x, ptrdiff_t inStride,
     DBL *const half = work; // n values, half-complex
     const Output spectrum = Interleaved(work + 2 * n);
     DBL *const gathered = spectrum.re; // n values, before the spectrum
+    DBL *const inner = work + RaderRealWork(factor);
     const double x0 = x[0];
     double sum = x0;
     for (ptrdiff_t i = 1; i < p; ++i) {
@@ -182,18 +178,14 @@ ErrorCode RaderReal(const PrimeFactor &factor, const DBL *x, ptrdiff_t inStride,
         sum += gathered[i - 1];
     }
     Fill(gathered + (p - 1), n - (p - 1), 0.0);
-    ErrorCode status = ExecuteReal(plan, gathered, half, 1, 1);
-    if (status < 0)
-        return status;
+    ExecuteReal(plan, gathered, half, 1, 1, inner);
     SetConjugateProduct(stage, 0, half[0], 0, spectrum);
     for (ptrdiff_t k = 1; 2 * k < n; ++k) {
         SetConjugateProduct(stage, k, half[k], half[n - k], spectrum);
         SetConjugateProduct(stage, n - k, half[k], -half[n - k], spectrum);
     }
     SetConjugateProduct(stage, n / 2, half[n / 2], 0, spectrum);
-    status = ExecuteComplex(plan, spectrum.re, spectrum.im, work, work + 1, 2, 2);
-    if (status < 0)
-        return status;
+    ExecuteComplex(plan, spectrum.re, spectrum.im, work, work + 1, 2, 2, inner);
     y[0] = sum;
     for (ptrdiff_t i = 1; i < p; ++i) {
         const ptrdiff_t k = stage.raderScatter[i];
@@ -202,16 +194,14 @@ ErrorCode RaderReal(const PrimeFactor &factor, const DBL *x, ptrdiff_t inStride,
         y[k * outStride] = x0 + work[2 * i - 2];
         y[(p - k) * outStride] = -work[2 * i - 1];
     }
-    return 0;
 }
 
-ErrorCode TransformComplex(const PrimeFactor &factor, Input x, Output y, DBL *work) {
-    return (factor.kind == DirectPrime ? DirectComplex : RaderComplex)(factor, x, y, work);
+void TransformComplex(const PrimeFactor &factor, Input x, Output y, DBL *work) {
+    (factor.kind == DirectPrime ? DirectComplex : RaderComplex)(factor, x, y, work);
 }
-ErrorCode TransformReal(const PrimeFactor &factor, const DBL *x, ptrdiff_t inStride, DBL *y,
-                        ptrdiff_t outStride, DBL *work) {
-    return (factor.kind == DirectPrime ? DirectReal : RaderReal)(factor, x, inStride, y, outStride,
-                                                                 work);
+void TransformReal(const PrimeFactor &factor, const DBL *x, ptrdiff_t inStride, DBL *y,
+                   ptrdiff_t outStride, DBL *work) {
+    (factor.kind == DirectPrime ? DirectReal : RaderReal)(factor, x, inStride, y, outStride, work);
 }
 
 // Value times the twiddle of column k and block j.
@@ -224,8 +214,8 @@ void SetTwiddled(const PrimeFactor &factor, ptrdiff_t k, ptrdiff_t j, double re,
 }
 
 // Columns k and m - k of the real twiddle stage.
-ErrorCode PrimePair(const PrimeFactor &factor, DBL *data, ptrdiff_t stride, ptrdiff_t m,
-                    ptrdiff_t k, DBL *work) {
+void PrimePair(const PrimeFactor &factor, DBL *data, ptrdiff_t stride, ptrdiff_t m, ptrdiff_t k,
+               DBL *work) {
     const ptrdiff_t p = factor.p;
     const ptrdiff_t n = p * m;
     const Output column = Interleaved(work);
@@ -234,22 +224,17 @@ ErrorCode PrimePair(const PrimeFactor &factor, DBL *data, ptrdiff_t stride, ptrd
         const DBL *const block = data + j * m * stride;
         SetTwiddled(factor, k, j, block[k * stride], block[(m - k) * stride], column);
     }
-    const ErrorCode status =
-        TransformComplex(factor, {column.re, column.im, 2}, column, work + 2 * p);
-    if (status < 0)
-        return status;
+    TransformComplex(factor, {column.re, column.im, 2}, column, work + 2 * p);
     for (ptrdiff_t q = 0; q < p; ++q) {
         const ptrdiff_t t = k + q * m;
         const bool direct = t <= (n - 1) / 2;
         data[(direct ? t : n - t) * stride] = work[2 * q];
         data[(direct ? n - t : t) * stride] = direct ? work[2 * q + 1] : -work[2 * q + 1];
     }
-    return 0;
 }
 
 // Column m/2 of the real twiddle stage: real values, p odd.
-ErrorCode PrimeMiddle(const PrimeFactor &factor, DBL *data, ptrdiff_t stride, ptrdiff_t m,
-                      DBL *work) {
+void PrimeMiddle(const PrimeFactor &factor, DBL *data, ptrdiff_t stride, ptrdiff_t m, DBL *work) {
     const ptrdiff_t p = factor.p;
     const ptrdiff_t n = p * m;
     const ptrdiff_t k = m / 2;
@@ -257,54 +242,62 @@ ErrorCode PrimeMiddle(const PrimeFactor &factor, DBL *data, ptrdiff_t stride, pt
     column.set(0, data[k * stride], 0);
     for (ptrdiff_t j = 1; j < p; ++j)
         SetTwiddled(factor, k, j, data[(j * m + k) * stride], 0, column);
-    const ErrorCode status =
-        TransformComplex(factor, {column.re, column.im, 2}, column, work + 2 * p);
-    if (status < 0)
-        return status;
+    TransformComplex(factor, {column.re, column.im, 2}, column, work + 2 * p);
     for (ptrdiff_t q = 0; k + q * m <= n / 2; ++q) {
         const ptrdiff_t t = k + q * m;
         data[t * stride] = work[2 * q];
         if (2 * t < n)
             data[(n - t) * stride] = work[2 * q + 1];
     }
-    return 0;
 }
 
 } // namespace
 
-ErrorCode PrimeComplexLeaf(const PrimeFactor &factor, const DBL *inRe, const DBL *inIm, DBL *outRe,
-                           DBL *outIm, ptrdiff_t inStride, ptrdiff_t outStride, int32_t count) {
+int64_t PrimeComplexWork(const PrimeFactor &factor, bool isLeaf) {
+    if (factor.kind == DirectPrime)
+        return 0;
+    const int64_t column = isLeaf ? 0 : 2 * int64_t{factor.p};
+    return column + RaderComplexWork(factor) + factor.stage->raderPlan->complexWork;
+}
+
+int64_t PrimeRealWork(const PrimeFactor &factor, bool isLeaf) {
+    if (factor.kind == DirectPrime)
+        return 0;
+    const FFTPlan &plan = *factor.stage->raderPlan;
+    const int64_t whole = RaderRealWork(factor) + std::max(plan.complexWork, plan.realWork);
+    return isLeaf ? whole : std::max(whole, PrimeComplexWork(factor, false));
+}
+
+void PrimeComplexLeaf(const PrimeFactor &factor, const DBL *inRe, const DBL *inIm, DBL *outRe,
+                      DBL *outIm, ptrdiff_t inStride, ptrdiff_t outStride, int32_t count,
+                      DBL *work) {
     const ptrdiff_t p = factor.p;
-    Scratch<ElementType::DBL> work;
-    ErrorCode status = work.allocate(ComplexWork(factor));
-    for (ptrdiff_t i = 0; i < count && status == 0; ++i) {
+    DBL stack[directWork];
+    DBL *const space = factor.kind == DirectPrime ? stack : work;
+    for (ptrdiff_t i = 0; i < count; ++i) {
         const Input x = {inRe + i * inStride, inIm + i * inStride, count * inStride};
         const Output y = {outRe + i * p * outStride, outIm + i * p * outStride, outStride};
-        status = TransformComplex(factor, x, y, work.data());
+        TransformComplex(factor, x, y, space);
     }
-    return Merge(status, work.release());
 }
 
-ErrorCode PrimeRealLeaf(const PrimeFactor &factor, const DBL *in, DBL *out, ptrdiff_t inStride,
-                        ptrdiff_t outStride, int32_t count) {
+void PrimeRealLeaf(const PrimeFactor &factor, const DBL *in, DBL *out, ptrdiff_t inStride,
+                   ptrdiff_t outStride, int32_t count, DBL *work) {
     const ptrdiff_t p = factor.p;
-    Scratch<ElementType::DBL> work;
-    ErrorCode status = work.allocate(RealWork(factor));
-    for (ptrdiff_t i = 0; i < count && status == 0; ++i)
-        status = TransformReal(factor, in + i * inStride, count * inStride, out + i * p * outStride,
-                               outStride, work.data());
-    return Merge(status, work.release());
+    DBL stack[directWork];
+    DBL *const space = factor.kind == DirectPrime ? stack : work;
+    for (ptrdiff_t i = 0; i < count; ++i)
+        TransformReal(factor, in + i * inStride, count * inStride, out + i * p * outStride,
+                      outStride, space);
 }
 
-ErrorCode PrimeComplexTwiddle(const PrimeFactor &factor, DBL *re, DBL *im, ptrdiff_t stride,
-                              int32_t m) {
+void PrimeComplexTwiddle(const PrimeFactor &factor, DBL *re, DBL *im, ptrdiff_t stride, int32_t m,
+                         DBL *work) {
     const ptrdiff_t p = factor.p;
-    Scratch<ElementType::DBL> work;
-    ErrorCode status = work.allocate(2 * int64_t{p} + ComplexWork(factor));
-    if (status < 0)
-        return status;
-    const Output column = Interleaved(work.data());
-    for (ptrdiff_t k = 0; k < m && status == 0; ++k) {
+    DBL stack[directWork];
+    DBL *const space = factor.kind == DirectPrime ? stack : work;
+    const Output column = Interleaved(space);
+    for (ptrdiff_t k = 0; k < m; ++k) {
         const Output y = {re + k * stride, im + k * stride, m * stride};
         column.set(0, y.re[0], y.im[0]);
         for (ptrdiff_t j = 1; j < p; ++j) {
@@ -313,21 +306,19 @@ ErrorCode PrimeComplexTwiddle(const PrimeFactor &factor, DBL *re, DBL *im, ptrdi
             else
                 SetTwiddled(factor, k, j, y.re[j * y.stride], y.im[j * y.stride], column);
         }
-        status = TransformComplex(factor, {column.re, column.im, 2}, y, work.data() + 2 * p);
+        TransformComplex(factor, {column.re, column.im, 2}, y, space + 2 * p);
     }
-    return Merge(status, work.release());
 }
 
-ErrorCode PrimeRealTwiddle(const PrimeFactor &factor, DBL *data, ptrdiff_t stride, int32_t m) {
-    Scratch<ElementType::DBL> work;
-    ErrorCode status = work.allocate(2 * int64_t{factor.p} + ComplexWork(factor));
-    if (status == 0)
-        status = TransformReal(factor, data, m * stride, data, m * stride, work.data());
-    for (ptrdiff_t k = 1; k <= (m - 1) / 2 && status == 0; ++k)
-        status = PrimePair(factor, data, stride, m, k, work.data());
-    if (m % 2 == 0 && status == 0)
-        status = PrimeMiddle(factor, data, stride, m, work.data());
-    return Merge(status, work.release());
+void PrimeRealTwiddle(const PrimeFactor &factor, DBL *data, ptrdiff_t stride, int32_t m,
+                      DBL *work) {
+    DBL stack[directWork];
+    DBL *const space = factor.kind == DirectPrime ? stack : work;
+    TransformReal(factor, data, m * stride, data, m * stride, space);
+    for (ptrdiff_t k = 1; k <= (m - 1) / 2; ++k)
+        PrimePair(factor, data, stride, m, k, space);
+    if (m % 2 == 0)
+        PrimeMiddle(factor, data, stride, m, space);
 }
 
 } // namespace qx

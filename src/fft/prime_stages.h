@@ -8,7 +8,8 @@
 namespace qx {
 
 // The leaf and the twiddle stage of a prime factor without a kernel, of either kind, with the
-// contracts of the kernels. They work in scratch memory and can only fail with ErrOutOfMemory.
+// contracts of the kernels. `work` has as many values as the two sizes below tell, for a plain sum
+// none.
 
 // One of the two factors of these stages: p with its kind and its tables.
 struct PrimeFactor {
@@ -17,14 +18,19 @@ struct PrimeFactor {
     const FFTStage *stage;
 };
 
-ErrorCode PrimeComplexLeaf(const PrimeFactor &factor, const DBL *inRe, const DBL *inIm, DBL *outRe,
-                           DBL *outIm, std::ptrdiff_t inStride, std::ptrdiff_t outStride,
-                           int32_t count);
-ErrorCode PrimeRealLeaf(const PrimeFactor &factor, const DBL *in, DBL *out, std::ptrdiff_t inStride,
-                        std::ptrdiff_t outStride, int32_t count);
-ErrorCode PrimeComplexTwiddle(const PrimeFactor &factor, DBL *re, DBL *im, std::ptrdiff_t stride,
-                              int32_t m);
-ErrorCode PrimeRealTwiddle(const PrimeFactor &factor, DBL *data, std::ptrdiff_t stride, int32_t m);
+// Of complex and of real data, as leaf or as twiddle stage, with that of the plan inside.
+int64_t PrimeComplexWork(const PrimeFactor &factor, bool isLeaf);
+int64_t PrimeRealWork(const PrimeFactor &factor, bool isLeaf);
+
+void PrimeComplexLeaf(const PrimeFactor &factor, const DBL *inRe, const DBL *inIm, DBL *outRe,
+                      DBL *outIm, std::ptrdiff_t inStride, std::ptrdiff_t outStride, int32_t count,
+                      DBL *work);
+void PrimeRealLeaf(const PrimeFactor &factor, const DBL *in, DBL *out, std::ptrdiff_t inStride,
+                   std::ptrdiff_t outStride, int32_t count, DBL *work);
+void PrimeComplexTwiddle(const PrimeFactor &factor, DBL *re, DBL *im, std::ptrdiff_t stride,
+                         int32_t m, DBL *work);
+void PrimeRealTwiddle(const PrimeFactor &factor, DBL *data, std::ptrdiff_t stride, int32_t m,
+                      DBL *work);
 
 } // namespace qx
 

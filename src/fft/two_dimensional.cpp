@@ -13,12 +13,12 @@ namespace {
 
 typedef HeapBlock<ElementType::CDB> ComplexBlock;
 
-ErrorCode Forward(const FFTPlan *plan, const CDB *in, CDB *out, int32_t n) {
-    return FFTComplexForward(plan, &in->re, &in->im, &out->re, &out->im, 2, 2, n);
+ErrorCode Forward(const FFTPlan *plan, const CDB *in, CDB *out, int32_t n, DBL *work) {
+    return FFTComplexForward(plan, &in->re, &in->im, &out->re, &out->im, 2, 2, n, work);
 }
 
-ErrorCode Inverse(const FFTPlan *plan, const CDB *in, CDB *out, int32_t n) {
-    return FFTComplexInverse(plan, &in->re, &in->im, &out->re, &out->im, 2, 2, n);
+ErrorCode Inverse(const FFTPlan *plan, const CDB *in, CDB *out, int32_t n, DBL *work) {
+    return FFTComplexInverse(plan, &in->re, &in->im, &out->re, &out->im, 2, 2, n, work);
 }
 
 void CopyElements(const CDB *from, int64_t count, CDB *to) {
@@ -107,11 +107,11 @@ private:
     int32_t opposites_; // the sum of the indices of two opposite columns
 };
 
-// Transforms the columns in work, which is row-major with `usedRows` rows, padded with zeros to
+// Transforms the columns in matrix, which is row-major with `usedRows` rows, padded with zeros to
 // `rows` values. set(c, count, columns, pitch) takes them as they come.
 template <class Set>
-ErrorCode ForwardColumns(const FFTPlan *plan, const ComplexBlock &work, int32_t usedRows,
-                         int32_t rows, int32_t cols, const Set &set) {
+ErrorCode ForwardColumns(const FFTPlan *plan, const ComplexBlock &matrix, int32_t usedRows,
+                         int32_t rows, int32_t cols, DBL *work, const Set &set) {
     const int64_t pitch = PaddedPitch(rows);
     ComplexBlock columns;
     ComplexBlock results;
@@ -121,11 +121,11 @@ ErrorCode ForwardColumns(const FFTPlan *plan, const ComplexBlock &work, int32_t 
         return failed;
     for (int32_t c = 0; c < cols; c += ColumnsAtOnce) {
         const int32_t count = ColumnsInBlock(c, cols);
-        GatherColumns<ElementType::CDB>(work.data() + c, PaddedPitch(cols), usedRows, count,
+        GatherColumns<ElementType::CDB>(matrix.data() + c, PaddedPitch(cols), usedRows, count,
                                         columns.data(), pitch);
         for (int32_t i = 0; i < count; ++i)
-            if (const ErrorCode failed =
-                    Forward(plan, columns.data() + i * pitch, results.data() + i * pitch, rows))
+            if (const ErrorCode failed = Forward(plan, columns.data() + i * pitch,
+                                                 results.data() + i * pitch, rows, work))
                 return failed;
         set(c, count, results.data(), pitch);
     }
@@ -143,9 +143,9 @@ void KeepHalf(const DBL *h, int32_t n, int32_t shift, CDB *kept) {
         kept[shift == 0 ? half : 0] = CDB{h[half], 0};
 }
 
-// The inverse transforms of the rows of frequencies 0 to count - 1, in this order, into work.
+// The inverse transforms of the rows of frequencies 0 to count - 1, in this order, into results.
 ErrorCode InverseRows(const FFTPlan *plan, const CDB *in, int32_t rows, int32_t cols, int32_t shift,
-                      int32_t count, CDB *work) {
+                      int32_t count, CDB *results, DBL *work) {
     ComplexBlock plain;
     if (shift != 0)
         if (const ErrorCode failed = plain.allocate(cols))
@@ -156,7 +156,8 @@ ErrorCode InverseRows(const FFTPlan *plan, const CDB *in, int32_t rows, int32_t 
             RotateFromShifted(row, cols, plain.data());
             row = plain.data();
         }
-        if (const ErrorCode failed = Inverse(plan, row, work + f * PaddedPitch(cols), cols))
+        if (const ErrorCode failed =
+                Inverse(plan, row, results + f * PaddedPitch(cols), cols, work))
             return failed;
     }
     return 0;
@@ -182,45 +183,54 @@ struct ComplexColumns {
     static constexpr auto Code = ElementType::CDB;
     static int32_t rowsUsed(int32_t rows) { return rows; }
     static constexpr auto gather = GatherColumns<Code>;
-    static ErrorCode inverse(const FFTPlan *plan, CDB *in, CDB *out, int32_t n) {
-        return Inverse(plan, in, out, n);
+    static int64_t columnWork(const FFTPlan *plan) { return plan->complexWork; }
+    static ErrorCode inverse(const FFTPlan *plan, CDB *in, CDB *out, int32_t n, DBL *work) {
+        return Inverse(plan, in, out, n, work);
     }
 };
 struct RealColumns {
     static constexpr auto Code = ElementType::DBL;
     static int32_t rowsUsed(int32_t rows) { return rows / 2 + 1; }
     static constexpr auto gather = GatherHalfComplex;
-    static ErrorCode inverse(const FFTPlan *plan, DBL *in, DBL *out, int32_t n) {
-        return FFTRealInverse(plan, in, out, 1, 1, n);
+    static int64_t columnWork(const FFTPlan *plan) { return plan->realWork; }
+    static ErrorCode inverse(const FFTPlan *plan, DBL *in, DBL *out, int32_t n, DBL *work) {
+        return FFTRealInverse(plan, in, out, 1, 1, n, work);
     }
 };
 
 // Rows first, then columns.
 // kept: a failed column ends the loop unreported, and the columns from there on stay unwritten.
+// None fails for want of memory, which is taken before the first row.
 template <class Columns>
 ErrorCode InverseMatrix(const FFTPlan *rowPlan, const FFTPlan *columnPlan, const CDB *in,
                         int32_t rows, int32_t cols, int32_t shift,
                         typename Element<Columns::Code>::type *out) {
     const int64_t pitch = PaddedPitch(rows);
     const int32_t used = Columns::rowsUsed(rows);
-    ComplexBlock work;
+    TransformWork work;
+    ComplexBlock matrix;
     HeapBlock<Columns::Code> columns;
     HeapBlock<Columns::Code> results;
-    if (const ErrorCode failed = work.allocate(used * PaddedPitch(cols)))
+    if (const ErrorCode failed =
+            work.take(std::max(rowPlan->complexWork, Columns::columnWork(columnPlan))))
+        return failed;
+    if (const ErrorCode failed = matrix.allocate(used * PaddedPitch(cols)))
         return failed;
     if (const ErrorCode failed = columns.allocate(ColumnsAtOnce * pitch))
         return failed;
     if (const ErrorCode failed = results.allocate(ColumnsAtOnce * pitch))
         return failed;
-    if (const ErrorCode failed = InverseRows(rowPlan, in, rows, cols, shift, used, work.data()))
+    if (const ErrorCode failed =
+            InverseRows(rowPlan, in, rows, cols, shift, used, matrix.data(), work.data()))
         return failed;
     int32_t done = ColumnsAtOnce;
     for (int32_t c = 0; c < cols && done == ColumnsAtOnce; c += ColumnsAtOnce) {
         const int32_t count = ColumnsInBlock(c, cols);
-        Columns::gather(work.data() + c, PaddedPitch(cols), rows, count, columns.data(), pitch);
+        Columns::gather(matrix.data() + c, PaddedPitch(cols), rows, count, columns.data(), pitch);
         done = 0;
-        while (done < count && Columns::inverse(columnPlan, columns.data() + done * pitch,
-                                                results.data() + done * pitch, rows) >= 0)
+        while (done < count &&
+               Columns::inverse(columnPlan, columns.data() + done * pitch,
+                                results.data() + done * pitch, rows, work.data()) >= 0)
             ++done;
         ScatterColumns<Columns::Code>(results.data(), pitch, rows, done, out + c, cols);
     }
@@ -235,9 +245,12 @@ ErrorCode FFT2DComplexForward(const FFTPlan *rowPlan, const FFTPlan *columnPlan,
         return ErrIndexOutOfRange;
     const int32_t cols = region.cols;
     const int32_t used = RowsTaken(region);
-    ComplexBlock work;
+    TransformWork work;
+    ComplexBlock matrix;
     ComplexBlock spectrum;
-    if (const ErrorCode failed = work.allocate(used * PaddedPitch(cols)))
+    if (const ErrorCode failed = work.take(std::max(rowPlan->complexWork, columnPlan->complexWork)))
+        return failed;
+    if (const ErrorCode failed = matrix.allocate(used * PaddedPitch(cols)))
         return failed;
     if (const ErrorCode failed = spectrum.allocate(cols))
         return failed;
@@ -246,9 +259,9 @@ ErrorCode FFT2DComplexForward(const FFTPlan *rowPlan, const FFTPlan *columnPlan,
         return failed;
     const int32_t back = cols / 2;
     for (int32_t r = 0; r < used; ++r) {
-        CDB *const row = work.data() + r * PaddedPitch(cols);
+        CDB *const row = matrix.data() + r * PaddedPitch(cols);
         CDB *const target = shift == 0 ? row : spectrum.data();
-        if (const ErrorCode failed = Forward(rowPlan, rows.row(r), target, cols))
+        if (const ErrorCode failed = Forward(rowPlan, rows.row(r), target, cols, work.data()))
             return failed;
         if (shift != 0) {
             CopyElements(target + (cols - back), back, row);
@@ -256,7 +269,7 @@ ErrorCode FFT2DComplexForward(const FFTPlan *rowPlan, const FFTPlan *columnPlan,
         }
     }
     const SpectrumMatrix target(out, region.rows, cols, shift);
-    return ForwardColumns(columnPlan, work, used, region.rows, cols,
+    return ForwardColumns(columnPlan, matrix, used, region.rows, cols, work.data(),
                           [&](int32_t c, int32_t count, const CDB *columns, int64_t pitch) {
                               target.setColumns(c, count, columns, pitch);
                           });
@@ -269,9 +282,12 @@ ErrorCode FFT2DRealForward(const FFTPlan *rowPlan, const FFTPlan *columnPlan, co
     const int32_t cols = region.cols;
     const int32_t kept = cols / 2 + 1;
     const int32_t used = RowsTaken(region);
-    ComplexBlock work;
+    TransformWork work;
+    ComplexBlock matrix;
     HeapBlock<ElementType::DBL> half;
-    if (const ErrorCode failed = work.allocate(used * PaddedPitch(kept)))
+    if (const ErrorCode failed = work.take(std::max(rowPlan->realWork, columnPlan->complexWork)))
+        return failed;
+    if (const ErrorCode failed = matrix.allocate(used * PaddedPitch(kept)))
         return failed;
     if (const ErrorCode failed = half.allocate(cols))
         return failed;
@@ -279,15 +295,16 @@ ErrorCode FFT2DRealForward(const FFTPlan *rowPlan, const FFTPlan *columnPlan, co
     if (const ErrorCode failed = rows.prepare())
         return failed;
     for (int32_t r = 0; r < used; ++r) {
-        if (const ErrorCode failed = FFTRealForward(rowPlan, rows.row(r), half.data(), 1, 1, cols))
+        if (const ErrorCode failed =
+                FFTRealForward(rowPlan, rows.row(r), half.data(), 1, 1, cols, work.data()))
             return failed;
-        KeepHalf(half.data(), cols, shift, work.data() + r * PaddedPitch(kept));
+        KeepHalf(half.data(), cols, shift, matrix.data() + r * PaddedPitch(kept));
     }
     // Frequency 0 and, of an even number, n/2 are opposite to themselves.
     const int32_t first = shift != 0 && cols % 2 != 0 ? 0 : 1;
     const int32_t last = shift == 0 && cols % 2 != 0 ? kept - 1 : kept - 2;
     const SpectrumMatrix target(out, region.rows, cols, shift);
-    return ForwardColumns(columnPlan, work, used, region.rows, kept,
+    return ForwardColumns(columnPlan, matrix, used, region.rows, kept, work.data(),
                           [&](int32_t c, int32_t count, const CDB *columns, int64_t pitch) {
                               target.setColumns(c, count, columns, pitch);
                               const int32_t from = std::max(c, first);

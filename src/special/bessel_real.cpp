@@ -233,7 +233,10 @@ double BesselY(double order, double x) {
         const double value = BesselYn(std::fabs(order), x);
         return order < 0 && IsOdd(order) ? -value : value;
     }
-    return NonIntegerY(order, x);
+    const double value = NonIntegerY(order, x);
+    if (std::isnan(value)) // the recurrence in the order has left the range
+        return order > 0 || CosPi(order) > 0 ? -kInfinity : kInfinity;
+    return value;
 }
 
 double SphericalBesselJ(int32_t n, double x) {

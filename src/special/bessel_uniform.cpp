@@ -109,6 +109,19 @@ ModifiedPair ModifiedBesselLargeOrder(double order, double x) {
     return {half * (scale * sumI * half), inverse * (0.5 * kTwoPi * scale * sumK * inverse)};
 }
 
+namespace {
+
+Complex TimesExp(Complex factor, Complex exponent) {
+    if (std::fabs(exponent.re) < 700)
+        return Exp(exponent) * factor;
+    // An infinite modulus would leave no sign to the parts.
+    const Complex direction = Exp(Complex{0, exponent.im}) * factor;
+    const double half = std::exp(0.5 * exponent.re);
+    return {direction.re * half * half, direction.im * half * half};
+}
+
+} // namespace
+
 ComplexModifiedPair ModifiedBesselOnDiagonal(double order, double x) {
     // z = x exp(i pi / 4): s^2 = order^2 + i x^2
     const Complex s = SquareRoot(Complex{order * order, x * x});
@@ -130,8 +143,8 @@ ComplexModifiedPair ModifiedBesselOnDiagonal(double order, double x) {
         power = power * t * (1 / order);
     }
     const Complex scale = Complex{1, 0} / SquareRoot(s * kTwoPi);
-    const Complex i = Exp(exponent) * (scale * sumI);
-    const Complex k = Exp(Complex{0, 0} - exponent) * (scale * sumK * (0.5 * kTwoPi));
+    const Complex i = TimesExp(scale * sumI, exponent);
+    const Complex k = TimesExp(scale * sumK * (0.5 * kTwoPi), Complex{0, 0} - exponent);
     return {i.re, i.im, k.re, k.im};
 }
 

@@ -17,6 +17,7 @@ constexpr double kStirlingFrom = 10;
 constexpr double kTiny = 1e-20;
 constexpr double kGammasTo = 33;
 constexpr double kHuge = 1e12;
+constexpr double kDirectTo = 50; // the product of three gammas stays in range
 
 // ln gamma(x) - ((x - 1/2) ln x - x + ln sqrt(2 pi)), x >= 10, to full precision of its sum with 1.
 double StirlingCorrection(double x) {
@@ -83,6 +84,26 @@ double OfPositive(double a, double b) {
     return GammaFunction(b) * std::pow(a, -b) * (1 - b * (b - 1) / (2 * a));
 }
 
+// sin(pi s) of a sum in two doubles.
+double SinPiOf(Extended s) { return SinPi(s.high) + kPi * s.low * CosPi(s.high); }
+
+// a <= 0, a <= b, with gammas that may leave the range: by the reflection of each gamma of a
+// negative argument the beta function of positive ones.
+double OfNegative(double a, double b) {
+    if (IsInteger(a) || (b <= 0 && IsInteger(b)))
+        return kNaN;
+    const Extended s = ExactSum(a, b);
+    const double sineA = SinPi(a);
+    if (s.high > 0)
+        return kPi / (sineA * b * CompleteBeta(1 - a, s.high));
+    const double sineS = SinPiOf(s);
+    if (sineS == 0)
+        return 0;
+    if (b > 0)
+        return sineS / sineA * CompleteBeta(b, 1 - s.high);
+    return kPi * (sineS / (sineA * SinPi(b))) / ((1 - s.high) * CompleteBeta(1 - a, 1 - b));
+}
+
 } // namespace
 
 double CompleteBeta(double a, double b) {
@@ -90,6 +111,8 @@ double CompleteBeta(double a, double b) {
         return kNaN;
     if (a > 0 && b > 0)
         return a > b ? OfPositive(a, b) : OfPositive(b, a);
+    if (std::fabs(a) > kDirectTo || std::fabs(b) > kDirectTo)
+        return a < b ? OfNegative(a, b) : OfNegative(b, a);
     const Extended s = ExactSum(a, b);
     double reciprocal = ReciprocalGamma(s.high);
     if (s.low != 0 && !IsInteger(s.high)) // beside a pole of gamma the rounding of the sum counts

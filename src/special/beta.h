@@ -7,7 +7,9 @@ namespace qx {
 // or at a pole of gamma.
 //
 // For positive arguments by Stirling's series for all three gammas at once, so that the digits
-// that cancel between them are not lost; otherwise by the gammas themselves.
+// that cancel between them are not lost; otherwise by the gammas themselves, or, beyond 50, by
+// reflection to positive arguments: the rounding of 1 - a then costs about |a| ln |a| eps beside
+// poles and some tens elsewhere.
 double CompleteBeta(double a, double b);
 
 } // namespace qx

@@ -290,10 +290,17 @@ double IncompleteGammaQ(double a, double x) {
 }
 
 double IncompleteBeta(double a, double b, double x) {
+    constexpr double tiniest = 0x1p-1000; // below, 1 / a may pass the range
     if (!std::isfinite(a) || !std::isfinite(b) || !(a >= 0.0 && b >= 0.0 && x >= 0.0 && x <= 1.0))
         return kNaN;
     if (x == 0.0 || x == 1.0)
         return x;
+    if (a < tiniest && b < tiniest)
+        return b / (a + b); // NaN where both are 0
+    if (a < tiniest)
+        return 1.0;
+    if (b < tiniest) // in proportion to b
+        return IncompleteBeta(a, tiniest, x) * (b / tiniest);
     if (a == 1.0) {
         if (b == 1.0)
             return x;

@@ -80,6 +80,15 @@ double Factor(double x, double v, double shift) {
            (shift == 0 ? std::sqrt(half) : 1 / std::sqrt(half));
 }
 
+// The ascending series, given its sum.
+double Ascending(double sum, double x, double v) {
+    const double value = sum * (0.5 * x / kHalfRootPi) * Factor(x, v, 1);
+    if (!std::isinf(value) || v >= 1)
+        return value;
+    const double root = std::pow(0.5 * x, 0.5 * (v + 1)); // the power alone may pass the range
+    return (sum / kHalfRootPi * root) * (root * ReciprocalGamma(v + 1.5));
+}
+
 } // namespace
 
 double Struve(double x, double v) {
@@ -99,7 +108,7 @@ double Struve(double x, double v) {
     const bool certain = first.error < 0.25 * kEpsilon; // the other candidate cannot be better
     const Estimate second = x >= 18 && !certain ? Struve3F0(x, v) : Estimate{0, kUnusable};
     if (ascends && !(first.error > second.error))
-        return first.sum * (0.5 * x / kHalfRootPi) * Factor(x, v, 1);
+        return Ascending(first.sum, x, v);
     return second.sum * (Factor(x, v, 0) / (0.5 * x)) / kRootPi + BesselY(v, x);
 }
 

@@ -1,8 +1,20 @@
 #include "stats/histogram.h"
 
+#include <cmath>
 #include <cstring>
 
 namespace qx {
+
+namespace {
+
+// 1, or a power of two, which rounds nothing, for ranges at the ends of the exponents.
+double UnitOfRange(double min, double max, int32_t bins) {
+    if (std::isinf(max - min))
+        return std::isinf(max) || std::isinf(min) ? 1.0 : 0x1p-2;
+    return std::isinf(bins / (max - min)) ? 0x1p512 : 1.0;
+}
+
+} // namespace
 
 ErrorCode ArrayHistogram(const DBL *x, int32_t n, double min, double max, I32 *counts, DBL *centres,
                          int32_t bins) {
@@ -18,17 +30,21 @@ ErrorCode ArrayHistogram(const DBL *x, int32_t n, double min, double max, I32 *c
         return 0;
     }
 
-    const double width = (max - min) / bins;
-    double centre = min + 0.5 * width;
+    // Everything in units in which the range and its reciprocal stay finite.
+    const double unit = UnitOfRange(min, max, bins);
+    const double low = min * unit;
+    const double range = max * unit - low;
+    const double width = range / bins;
+    double centre = low + 0.5 * width;
     for (int32_t k = 0; k < bins; ++k) {
-        centres[k] = centre;
+        centres[k] = centre / unit;
         centre += width;
     }
-    const double perUnit = bins / (max - min);
+    const double perUnit = bins / range;
     for (int32_t i = 0; i < n; ++i) {
         // Tested as a double, since NaN and far outliers have no integer value. From 0 on the
         // conversion is the floor.
-        const double position = (x[i] - min) * perUnit;
+        const double position = (x[i] * unit - low) * perUnit;
         if (position >= 0.0 && position < bins)
             ++counts[static_cast<int32_t>(position)];
         else if (x[i] == max)

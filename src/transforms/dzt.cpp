@@ -3,6 +3,7 @@
 #include "frame/constants.h"
 #include "frame/scratch.h"
 
+#include <algorithm>
 #include <cmath>
 #include <cstddef>
 #include <limits>
@@ -40,7 +41,10 @@ struct SubSpectrum<ElementType::DBL> {
 
     SubSpectrum(DBL *work, int32_t subLength) : y(work), h(work + subLength), n(subLength) {}
     void gather(int32_t t, DBL value) const { y[t] = value; }
-    ErrorCode transform(const FFTPlan *plan) const { return FFTRealForward(plan, y, h, 1, 1, n); }
+    static int64_t transformWork(const FFTPlan *plan) { return plan->realWork; }
+    ErrorCode transform(const FFTPlan *plan, DBL *work) const {
+        return FFTRealForward(plan, y, h, 1, 1, n, work);
+    }
     CDB bin(int32_t k) const {
         const int32_t mirror = n - k;
         if (k == 0 || k == mirror)
@@ -61,26 +65,24 @@ struct SubSpectrum<ElementType::CDB> {
         yRe[t] = value.re;
         yIm[t] = value.im;
     }
-    ErrorCode transform(const FFTPlan *plan) const {
-        return FFTComplexForward(plan, yRe, yIm, re, im, 1, 1, n);
+    static int64_t transformWork(const FFTPlan *plan) { return plan->complexWork; }
+    ErrorCode transform(const FFTPlan *plan, DBL *work) const {
+        return FFTComplexForward(plan, yRe, yIm, re, im, 1, 1, n, work);
     }
     CDB bin(int32_t k) const { return {re[k], im[k]}; }
 };
 
 // Every sections-th value from j on, with zeros behind the input's end.
 template <ElementType Code>
-ErrorCode Gather(const typename Element<Code>::type *x, int32_t n, int32_t sections, int32_t j,
-                 const SubSpectrum<Code> &sub) {
+void Gather(const typename Element<Code>::type *x, int32_t n, int32_t sections, int32_t j,
+            const SubSpectrum<Code> &sub) {
     int64_t u = j;
     for (int32_t t = 0; t < sub.n; ++t, u += sections) {
-        if (u > std::numeric_limits<int32_t>::max())
-            return ErrLengthTooLarge;
         if (u < n)
             sub.gather(t, x[u]);
         else
             sub.gather(t, {});
     }
-    return 0;
 }
 
 // Adds the bins of one sub-sequence, each turned by its delay. The turn starts at angle `phase`
@@ -116,26 +118,30 @@ ErrorCode BandTransform(const FFTPlan *plan, typename Element<Code>::type *x, in
         return ErrFFTSizeNotPositive;
     if (!plan || plan->length != subLength)
         return ErrInternal;
-    // A length beyond int32 cannot be folded into; it ends in ErrLengthTooLarge while gathering.
+    // A length beyond int32 cannot be folded into; it ends in ErrLengthTooLarge below.
     const int64_t L = int64_t{sections} * subLength;
     if (n > L)
         FoldInput<Code>(x, n, static_cast<int32_t>(L), subLength);
     for (int32_t i = 0; i < size; ++i)
         out[i] = CDB{};
 
+    const int64_t gathered = SubSpectrum<Code>::WorkPerBin * subLength;
     Scratch<ElementType::DBL> work;
-    if (const ErrorCode failed = work.allocate(SubSpectrum<Code>::WorkPerBin * subLength))
+    if (const ErrorCode failed = work.allocate(gathered + SubSpectrum<Code>::transformWork(plan)))
         return failed;
+    if (L - 1 > std::numeric_limits<int32_t>::max()) // the last index of the last sub-sequence
+        return ErrLengthTooLarge;
     const SubSpectrum<Code> sub(work.data(), subLength);
     const int32_t remainder = start % subLength;
     const int32_t firstBin = remainder < 0 ? remainder + subLength : remainder;
     const double startInL = static_cast<double>(start % L);
     ErrorCode status = 0;
-    for (int32_t j = 0; j < sections; ++j) {
-        if (const ErrorCode failed = Gather<Code>(x, n, sections, j, sub))
-            return failed;
+    // Sub-sequences from the n-th on are zeros and would add zeros.
+    const int32_t used = std::min(sections, n);
+    for (int32_t j = 0; j < used; ++j) {
+        Gather<Code>(x, n, sections, j, sub);
         // A sub-sequence whose transform failed is left out; only the last status is reported.
-        status = sub.transform(plan);
+        status = sub.transform(plan, work.data() + gathered);
         if (status != 0)
             continue;
         const double step = -kTwoPi * (static_cast<double>(j) / static_cast<double>(L));

@@ -1,6 +1,7 @@
 #include "fft/plan_slot.h"
 #include "qx/errors.h"
 #include "qx/fft2d.h"
+#include "qx/frame.h"
 #include "tests/support/hostile_host.h"
 #include "tests/support/transform_reference.h"
 
@@ -210,6 +211,45 @@ TEST(TwoDimensional, AHostThatRefusesIsQuotedWithThePlansKept) {
             return ReInvFFT2D_H_IDP(complex.handle(), 0, realOut.handle(), &node.instance);
         });
     }
+}
+
+// In a workspace that has no room, an inverse transform is whole, where its columns are plain sums,
+// or it fails; before, it told success with columns that were never written.
+TEST(TwoDimensional, InversesAreWholeOrFailWithoutWorkspace) {
+    WorkspaceStatus status = {};
+    ASSERT_EQ(0, InitializeAnalysisWorkspaceH(64, &status));
+    for (const int32_t rows : {23, 46, 47, 32, 53, 106, 167}) {
+        SCOPED_TRACE(rows);
+        const bool needsMemory = rows % 53 == 0 || rows == 167;
+        CDBMatrix in(rows, 20);
+        Fill(in);
+        const auto inverses = [&](bool isCramped, CDBMatrix &out, DBLMatrix &realOut) {
+            Node node;
+            EXPECT_EQ(qx::PlanSlotAcquire(&node.slot, 20), 0);
+            EXPECT_EQ(qx::PlanSlotAcquire(&node.second, rows), 0);
+            if (isCramped)
+                EnableAnalysisWorkspaceH(&status);
+            const ErrorCode code =
+                CxInvFFT2D_H(in.handle(), 0, out.handle(), &node.slot, &node.second);
+            EXPECT_EQ(ReInvFFT2D_H(in.handle(), 0, realOut.handle(), &node.slot, &node.second),
+                      code);
+            if (isCramped)
+                DisableAnalysisWorkspaceH(&status);
+            return code;
+        };
+        CDBMatrix out(1, 1), expected(1, 1);
+        DBLMatrix realOut(1, 1), realExpected(1, 1);
+        ASSERT_EQ(inverses(false, expected, realExpected), 0);
+        ASSERT_EQ(inverses(true, out, realOut), needsMemory ? ErrOutOfMemory : 0);
+        ASSERT_EQ(out.rows(), needsMemory ? 0 : rows);
+        ASSERT_EQ(realOut.rows(), needsMemory ? 0 : rows);
+        for (int32_t i = 0; i < (needsMemory ? 0 : rows * 20); ++i) {
+            ASSERT_EQ(out.data()[i].re, expected.data()[i].re);
+            ASSERT_EQ(out.data()[i].im, expected.data()[i].im);
+            ASSERT_EQ(realOut.data()[i], realExpected.data()[i]);
+        }
+    }
+    ASSERT_EQ(0, UninitializeAnalysisWorkspaceH(&status));
 }
 
 TEST(TwoDimensional, RequestsBeyondMemoryEndInACode) {

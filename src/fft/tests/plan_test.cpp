@@ -144,7 +144,6 @@ TEST(Plan, HoldsTheRootsAtTheirPlaces) {
     }
 }
 
-// Each allocation of a plan with three sub-plans fails in turn: nothing stays behind.
 // Threads that take and give back the same lengths at once, primes with plans inside plans among
 // them, end up with one plan per length and none in the end.
 TEST(Plan, IsSharedByThreadsThatBuildItAtOnce) {
@@ -197,6 +196,7 @@ TEST(PlanSlot, IsRefusedWhereNobodyWouldSweepIt) {
     qx::test::RunSweepOf(slot);
 }
 
+// Each allocation of a plan with three sub-plans fails in turn: nothing stays behind.
 TEST(Plan, IsBuiltWholeOrNotAtAll) {
     if (!qx::test::HeapProbe::works())
         GTEST_SKIP();
@@ -214,6 +214,20 @@ TEST(Plan, IsBuiltWholeOrNotAtAll) {
     EXPECT_GT(failures, 30);
     EXPECT_EQ(held.get()->refCount, 1);
     EXPECT_EQ(held.get()->next, nullptr);
+}
+
+// Tables grow with the length whatever its factors are: a few dozen of them, none longer than
+// eight values for each one of the transform.
+TEST(Plan, TakesMemoryInProportionToItsLength) {
+    if (!qx::test::HeapProbe::works())
+        GTEST_SKIP();
+    for (const int32_t n : {10007, 24469, 99991, 1000003, 1 << 20, 1018081, 2 * 500009}) {
+        const qx::test::HeapProbe probe(0, std::size_t{64} * static_cast<std::size_t>(n));
+        FFTPlan *const plan = qx::create_oxfft_table(n);
+        EXPECT_NE(plan, nullptr) << n;
+        EXPECT_LT(probe.liveAllocations(), 60) << n;
+        qx::destroy_oxfft_table(plan);
+    }
 }
 
 TEST(Plan, TableThatCannotBeHeldIsNull) {

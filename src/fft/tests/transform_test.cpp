@@ -4,6 +4,7 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cmath>
 #include <complex>
 #include <cstdint>
@@ -298,13 +299,14 @@ TEST(Transform, ThreadsShareAPlan) {
     }
 }
 
-// Kernels need no scratch memory; the other primes report its lack, in leaves and in stages.
+// Kernels and plain sums need no scratch memory; Rader's algorithm reports its lack, in leaves and
+// in stages, and leaves the output alone. Memory given by the caller serves as well.
 TEST(Transform, PrimesReportMissingScratchMemory) {
     ASSERT_EQ(0, qx::analysisWorkspace.reserve(64));
     ASSERT_EQ(0, qx::analysisWorkspace.setEnabled(true));
     for (const int32_t n : {23, 47, 53, 107, 167, 46, 106, 334, 2809, 23 * 32, 1000, 41 * 43}) {
-        const bool kernelsOnly = n == 1000 || n == 41 * 43;
-        const ErrorCode expected = kernelsOnly ? 0 : ErrOutOfMemory;
+        const bool isLight = n % 23 == 0 || n % 47 == 0 || n == 1000 || n == 41 * 43;
+        const ErrorCode expected = isLight ? 0 : ErrOutOfMemory;
         SCOPED_TRACE(n);
         qx::analysisWorkspace.setEnabled(false);
         const PlanReference plan(n);
@@ -316,9 +318,39 @@ TEST(Transform, PrimesReportMissingScratchMemory) {
         EXPECT_EQ(expected, qx::FFTRealForward(plan.get(), &x[0], &y[0], 1, 2, n));
         EXPECT_EQ(expected, qx::FFTRealInverse(plan.get(), &x[0], &y[0], 1, 1, n));
         EXPECT_EQ(0, qx::analysisWorkspace.liveBlocks());
+
+        std::vector<double> given(static_cast<std::size_t>(plan.get()->complexWork)),
+            expectedY(2 * n);
+        EXPECT_EQ(isLight, given.empty());
+        EXPECT_EQ(0, qx::FFTComplexForward(plan.get(), &x[0], &x[1], &y[0], &y[1], 2, 2, n,
+                                           given.data()));
+        qx::analysisWorkspace.setEnabled(false);
+        EXPECT_EQ(0, qx::FFTComplexForward(plan.get(), &x[0], &x[1], &expectedY[0], &expectedY[1],
+                                           2, 2, n));
+        qx::analysisWorkspace.setEnabled(true);
+        EXPECT_EQ(y, expectedY);
     }
     qx::analysisWorkspace.setEnabled(false);
     ASSERT_EQ(0, qx::analysisWorkspace.giveBack());
+}
+
+// The work memory that a plan tells is all that is touched: guards behind it stay.
+TEST(Transform, WorkMemoryIsAsLongAsThePlanTells) {
+    for (const int32_t n : {53, 107, 167, 719, 106, 334, 2809, 53 * 59 * 3, 53 * 32, 10007}) {
+        SCOPED_TRACE(n);
+        const PlanReference plan(n);
+        const std::size_t complexWork = static_cast<std::size_t>(plan.get()->complexWork);
+        const std::size_t realWork = static_cast<std::size_t>(plan.get()->realWork);
+        std::vector<double> x = Noise(2 * n), y(2 * n);
+        const double guard = 1234.5;
+        std::vector<double> work(std::max(complexWork, realWork) + 1, guard);
+        qx::FFTComplexForward(plan.get(), &x[0], &x[1], &y[0], &y[1], 2, 2, n, work.data());
+        EXPECT_EQ(work[complexWork], guard);
+        EXPECT_NE(work[complexWork - 3], guard) << "none is asked for in vain";
+        work.assign(work.size(), guard);
+        qx::FFTRealForward(plan.get(), &x[0], &y[0], 1, 1, n, work.data());
+        EXPECT_EQ(work[realWork], guard);
+    }
 }
 
 } // namespace

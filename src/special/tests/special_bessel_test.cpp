@@ -90,6 +90,28 @@ TEST(SpecialBessel, KeepsTheRulesOfDomainsAndLimits) {
     EXPECT_EQ(Value("Airy", 104, 0, 3), largest);
 }
 
+// Next to the ends of the range a value is finite or infinite as it is in truth, with its sign;
+// references from mpmath.
+TEST(SpecialBessel, OverflowsWhereTheValueDoes) {
+    EXPECT_NEAR(Value("Struve", 2.9e-8, -34.69) / 4.1428455173572960447e+300, 1.0, 1e-12);
+    EXPECT_EQ(Value("BesselYr", 10.3, 1e-100), -kInfinity);
+    EXPECT_EQ(Value("BesselYr", 14.5, 1e-30), -kInfinity);
+    EXPECT_EQ(Value("BesselYr", -10.3, 1e-100), -kInfinity);
+    EXPECT_EQ(Value("BesselYr", -11.3, 1e-100), kInfinity);
+    EXPECT_EQ(Value("BesselYr", -14.8, 1e-60), kInfinity);
+    EXPECT_EQ(Value("BesselYs", 14, 1e-60), -kInfinity);
+    const struct {
+        double x, n, ker, kei;
+    } points[] = {{0.5, 400, kInfinity, -kInfinity},
+                  {0.5, 401, -kInfinity, -kInfinity},
+                  {0.01, 150, -kInfinity, -kInfinity},
+                  {3, 1000, kInfinity, -kInfinity}};
+    for (const auto &p : points) {
+        EXPECT_EQ(Value("KelvinK", p.x, p.n, 0), p.ker) << p.n;
+        EXPECT_EQ(Value("KelvinK", p.x, p.n, 1), p.kei) << p.n;
+    }
+}
+
 TEST(SpecialBessel, FoldsSigns) {
     EXPECT_EQ(Value("BesselJr", -3, 2.2), -Value("BesselJr", 3, 2.2));
     EXPECT_EQ(Value("BesselJr", 3, -2.2), -Value("BesselJr", 3, 2.2));

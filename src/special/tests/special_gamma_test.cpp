@@ -40,6 +40,27 @@ TEST(SpecialGamma, AgreesWithReferencesOnBothSidesOfEachThreshold) {
     EXPECT_GT(qx::test::ExpectAgreement(Exports(), qx::test::TestData("gamma.dat")), 200);
 }
 
+// Where the gammas of the definition leave the range; mpmath at 30 digits.
+TEST(SpecialGamma, CompleteBetaOfLargeNegativeArguments) {
+    const struct {
+        double a, b, value;
+    } points[] = {
+        {-100.1, -99.1, -1.005181917797697816e+60},  {-180.5, 200.25, -2.9735734452571381313e+26},
+        {-60.3, -10.7, -0.082978189267207851327},    {-55.5, 30.25, 5.3697741269673577702e-18},
+        {-200.7, 3.3, -8.1055830884704666487e-8},    {-51.2, 51.45, 0.076877834205739345071},
+        {-120.4, 60.9, -1.3675577814054160216e-37},  {-300.3, -0.4, -36.502065585336312088},
+        {-170.6, 100.35, 7.6060403420021200544e-52}, {-0.3, 60.2, -14.744765627658186662},
+        {-3.3, 1000.7, 3466623073.218291045},        {-51.25, 0.75, -0.09030933984921073535},
+    };
+    for (const auto &p : points) {
+        EXPECT_NEAR(Value("BetaComplete", p.a, p.b) / p.value, 1.0, 2e-12) << p.a << ' ' << p.b;
+        EXPECT_EQ(Value("BetaComplete", p.a, p.b), Value("BetaComplete", p.b, p.a));
+    }
+    EXPECT_EQ(Value("BetaComplete", -60.5, 30.5), 0) << "a pole of gamma(a + b)";
+    EXPECT_TRUE(std::isnan(Value("BetaComplete", -60, 30.5)));
+    EXPECT_TRUE(std::isnan(Value("BetaComplete", -60.5, -3)));
+}
+
 TEST(SpecialGamma, KeepsTheRulesOfDomainsAndLimits) {
     const qx::test::Rule rules[] = {
         {"Psi", {kInfinity}, kInfinity},
@@ -85,6 +106,13 @@ TEST(SpecialGamma, KeepsTheRulesOfDomainsAndLimits) {
         {"BetaComplete", {kInfinity, 1}, kNaN},
         {"BetaComplete", {1, -kInfinity}, kNaN},
         {"BetaComplete", {kNaN, 1}, kNaN},
+        {"Beta", {0, 2, 0.3}, 1},
+        {"Beta", {5e-324, 2, 0.3}, 1},
+        {"Beta", {1e-310, 2, 0.3}, 1},
+        {"Beta", {0, 5e-324, 0.3}, 1},
+        {"Beta", {2, 0, 0.3}, 0},
+        {"Beta", {5e-324, 5e-324, 0.3}, 0.5},
+        {"Beta", {0, 0, 0.3}, kNaN},
         {"Beta", {1, 1, 0.3}, 0.3},
         {"Beta", {2, 3, 0}, 0},
         {"Beta", {2, 3, 1}, 1},

@@ -97,6 +97,27 @@ TEST(Anova, AWorkedExampleWithLabelsInAnyOrder) {
     EXPECT_EQ(AnovaOf(y, labels, 3, 0.0).fCritical, std::numeric_limits<double>::infinity());
 }
 
+// As many labels as half the data, whose bits lie far apart or side by side: by the number of
+// look-ups of a linear search, 10^12, this would take half an hour.
+TEST(Anova, ManyLevelsTakeTimeInProportionToTheData) {
+    constexpr int32_t k = 1 << 20;
+    for (const uint32_t step : {1u, 1u << 11 | 1u, 0x9e3779b1u}) {
+        std::vector<double> y;
+        std::vector<int32_t> labels;
+        uint32_t label = 0x80000000u;
+        for (int32_t i = 0; i < k; ++i) {
+            label += step;
+            const double level = i % 3;
+            y.insert(y.end(), {level, level + 2});
+            labels.insert(labels.end(), 2, static_cast<int32_t>(label));
+        }
+        const Anova a = AnovaOf(y, labels, k, 0.05);
+        EXPECT_EQ(a.err, 0);
+        EXPECT_NEAR(a.ssError, 2.0 * k, 1e-3); // each pair is one off its mean
+        EXPECT_NEAR(a.ssBetween, 2.0 * k * 2 / 3, 10);
+    }
+}
+
 TEST(Anova, CodesComeInTheirOrder) {
     const std::vector<double> y{1, 2, 3, 4};
     const auto code = [&](const std::vector<int32_t> &labels, int32_t k, double alpha) {

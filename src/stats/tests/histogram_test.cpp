@@ -77,6 +77,21 @@ TEST(Histogram, CentresAreAccumulated) {
     EXPECT_NE(expected[9], 0.95) << "the drift shows in this case";
 }
 
+// Ranges whose width or whose bins per unit leave the exponents.
+TEST(Histogram, CountsAtBothEndsOfTheExponents) {
+    constexpr double least = std::numeric_limits<double>::denorm_min();
+    constexpr double most = std::numeric_limits<double>::max();
+    const Histogram tiny = HistogramOf({0.0, 1 * least, 2 * least, 3 * least, 4 * least}, 4);
+    EXPECT_EQ(tiny.counts, (std::vector<int32_t>{1, 1, 1, 2}));
+    const Histogram wide = HistogramOf({-most, -0.6 * most, -0.1 * most, 1.0, 0.7 * most, most}, 4);
+    EXPECT_EQ(wide.counts, (std::vector<int32_t>{2, 1, 1, 2}));
+    for (std::size_t k = 0; k < 4; ++k)
+        EXPECT_DOUBLE_EQ(wide.centres[k], (0.5 * static_cast<double>(k) - 0.75) * most);
+    const Histogram one = HistogramOf({-most, most}, 1);
+    EXPECT_EQ(one.counts, (std::vector<int32_t>{2}));
+    EXPECT_EQ(one.centres, (std::vector<double>{0.0}));
+}
+
 TEST(Histogram, TreatsEdgesConstantsAndNaN) {
     const Histogram edge = HistogramOf({0.0, 1.0, 2.0, 4.0}, 4);
     // Times the bins per unit: divided by the width of a bin, 0.3 would stand one bin lower.

@@ -1,6 +1,7 @@
 #include "fft/plan_slot.h"
 #include "qx/dzt.h"
 #include "qx/errors.h"
+#include "qx/frame.h"
 #include "tests/support/hostile_host.h"
 #include "tests/support/transform_reference.h"
 #include "transforms/dzt.h"
@@ -9,6 +10,8 @@
 
 #include <cmath>
 #include <limits>
+#include <utility>
+#include <vector>
 
 namespace {
 
@@ -187,6 +190,46 @@ TEST(BandTransform, AHostThatRefusesIsQuoted) {
         EXPECT_NE(node.slot, nullptr);
         EXPECT_EQ(out.size(), hostStatus < 0 ? 0 : 2) << "only a negative status empties";
     }
+}
+
+// Two billion sections of which four have a value: the time follows the data.
+TEST(BandTransform, SectionsBeyondTheDataCostNothing) {
+    const std::vector<double> values{1.5, -2, 0.25, 3};
+    const DBLArray x(values);
+    for (const auto &[sections, subLength] : {std::pair{2147483647, 1}, {1 << 28, 7}}) {
+        CDBArray out;
+        Node node;
+        ASSERT_EQ(ReDZTH(x.handle(), sections, subLength, 1 << 27, 3, out.handle(), &node.slot), 0);
+        ASSERT_EQ(out.size(), 3);
+        const long double L = static_cast<long double>(sections) * subLength;
+        for (int32_t i = 0; i < 3; ++i) {
+            long double re = 0, im = 0;
+            for (int32_t u = 0; u < 4; ++u) {
+                const long double angle = -8 * std::atan(1.0L) * u * ((1 << 27) + i) / L;
+                re += values[static_cast<std::size_t>(u)] * std::cos(angle);
+                im += values[static_cast<std::size_t>(u)] * std::sin(angle);
+            }
+            EXPECT_NEAR(out.data()[i].re, static_cast<double>(re), 1e-14);
+            EXPECT_NEAR(out.data()[i].im, static_cast<double>(im), 1e-14);
+        }
+    }
+}
+
+// A workspace with room for the sub-sequences but not for their transforms is a failure, not a sum
+// without them.
+TEST(BandTransform, MissingMemoryOfATransformIsReported) {
+    WorkspaceStatus status = {};
+    ASSERT_EQ(0, InitializeAnalysisWorkspaceH(2048, &status));
+    const DBLArray x(std::vector<double>(150, 1.0));
+    CDBArray out;
+    Node node;
+    ASSERT_EQ(qx::PlanSlotAcquire(&node.slot, 53), 0);
+    EnableAnalysisWorkspaceH(&status);
+    EXPECT_EQ(ReDZTH(x.handle(), 3, 53, 0, 5, out.handle(), &node.slot), ErrOutOfMemory);
+    DisableAnalysisWorkspaceH(&status);
+    EXPECT_EQ(out.size(), 0);
+    EXPECT_EQ(ReDZTH(x.handle(), 3, 53, 0, 5, out.handle(), &node.slot), 0);
+    ASSERT_EQ(0, UninitializeAnalysisWorkspaceH(&status));
 }
 
 } // namespace

@@ -1,0 +1,39 @@
+#include "fft/plan_slot.h"
+
+#include <cstdio>
+#include <cstdlib>
+
+// A host that cleans up in its last exit handler: it was registered before the module's static
+// objects were made, so it runs after they are gone. The sweep has to find the plan cache in order,
+// and a plan can still be had. The process ends with 0 only from inside the handler.
+
+namespace {
+
+PlanSlot kept[3];
+
+void SweepLast() {
+    FFTPlan *const before = qx::create_oxfft_table(106);
+    const bool isShared = before == qx::HeldPlan(&kept[0]);
+    qx::destroy_oxfft_table(before);
+    for (PlanSlot slot : kept)
+        qx::CellSweep(slot);
+    FFTPlan *const after = qx::create_oxfft_table(1000);
+    const bool isAlone = after != nullptr && after->refCount == 1 && after->next == nullptr;
+    qx::destroy_oxfft_table(after);
+    std::_Exit(isShared && isAlone ? 0 : 2);
+}
+
+[[gnu::constructor(101)]] void RegisterFirst() { std::atexit(SweepLast); }
+
+} // namespace
+
+int main() {
+    const int32_t lengths[] = {106, 1000, 53};
+    for (int i = 0; i < 3; ++i) {
+        if (qx::PlanSlotAcquireIDP(&kept[i], lengths[i]) != 0) {
+            std::fputs("no plan\n", stderr);
+            std::_Exit(3);
+        }
+    }
+    return 1; // unless the handler says otherwise
+}
