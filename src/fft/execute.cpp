@@ -299,6 +299,8 @@ ErrorCode FFTRealInverse(const FFTPlan *plan, DBL *in, DBL *out, int32_t inStrid
 
 ErrorCode FFTComplexForward(const FFTPlan *plan, const DBL *inRe, const DBL *inIm, DBL *outRe,
                             DBL *outIm, int32_t inStride, int32_t outStride, int32_t n) {
+    if (plan->complexWork == 0) // without the scope of a block, which short transforms feel
+        return FFTComplexForward(plan, inRe, inIm, outRe, outIm, inStride, outStride, n, nullptr);
     TransformWork work;
     if (const ErrorCode failed = work.take(plan->complexWork))
         return failed;
@@ -315,6 +317,8 @@ ErrorCode FFTComplexInverse(const FFTPlan *plan, const DBL *inRe, const DBL *inI
 
 ErrorCode FFTRealForward(const FFTPlan *plan, const DBL *in, DBL *out, int32_t inStride,
                          int32_t outStride, int32_t n) {
+    if (plan->realWork == 0)
+        return FFTRealForward(plan, in, out, inStride, outStride, n, nullptr);
     TransformWork work;
     if (const ErrorCode failed = work.take(plan->realWork))
         return failed;

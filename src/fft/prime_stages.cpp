@@ -39,13 +39,17 @@ Output Interleaved(DBL *values) { return {values, values + 1, 2}; }
 // A padded convolution has its spectrum in work too.
 bool IsPadded(const PrimeFactor &factor) { return factor.stage->raderPlan->length != factor.p - 1; }
 
+// Cache lines' worth of values, so that what stands behind is placed no worse.
+int64_t WholeLines(int64_t values) { return (values + 7) / 8 * 8; }
+
 // The values of work that a transform by Rader's algorithm takes for itself. That of the
 // transforms of its convolution stands behind them.
 int64_t RaderComplexWork(const PrimeFactor &factor) {
-    return IsPadded(factor) ? 4 * int64_t{factor.stage->raderPlan->length} : 2 * int64_t{factor.p};
+    const int64_t n = factor.stage->raderPlan->length;
+    return WholeLines(IsPadded(factor) ? 4 * n : 2 * n);
 }
 int64_t RaderRealWork(const PrimeFactor &factor) {
-    return 4 * int64_t{factor.stage->raderPlan->length};
+    return WholeLines(4 * int64_t{factor.stage->raderPlan->length});
 }
 
 // A plain sum works on the stack: a column of complex values, and as much again.
