@@ -426,9 +426,9 @@ private:
     }
     void checkInput(std::size_t i) const {
         const Argument &argument = scenario_.arguments[i];
-        const bool isSame =
-            *blocks_.bytes(i) == argument.bytes.size() &&
-            std::memcmp(blocks_.elements(i), argument.bytes.data(), argument.bytes.size()) == 0;
+        const unsigned char *elements = blocks_.elements(i);
+        const bool isSame = std::equal(elements, elements + *blocks_.bytes(i),
+                                       argument.bytes.begin(), argument.bytes.end());
         if (!isSame)
             Tell("the input %s has changed", thunk_.parameters[i].name);
     }
