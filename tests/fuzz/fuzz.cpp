@@ -691,6 +691,7 @@ int main(int count, char **words) {
                              " [--export NAME] [--round N] [--list]\n");
         return 2;
     }
+    std::signal(SIGTERM, qx::test::Die);
     if (__sanitizer_set_death_callback != nullptr)
         __sanitizer_set_death_callback(qx::test::TellWhereItEnded);
     else
