@@ -48,7 +48,7 @@ constexpr double slowness = 30;
 #else
 constexpr double slowness = 1;
 #endif
-constexpr double secondsPerCall = 2 * slowness; // of the processor
+constexpr double secondsPerCall = 5 * slowness; // of the processor
 // Neither the host nor the heap gives more in one piece, so that time is bounded by the data and
 // only a loop over a parameter can take long.
 constexpr std::size_t largestBlock = 4U << 20;
@@ -434,7 +434,8 @@ private:
     }
     uint64_t hash() const {
         Hash hash;
-        if (status_ < 0) // an output may keep what it held
+        // An output may keep what it held.
+        if (status_ < 0 || status_ == statusNoMemory)
             return 0;
         for (std::size_t i = 0; i < thunk_.parameters.size(); ++i) {
             const Parameter &parameter = thunk_.parameters[i];

@@ -27,10 +27,7 @@ constexpr KeptOddity keptOddities[] = {
     {"AutoCorrelation80", Oddity::SizeBeyondBlock, "the resize is not looked at"},
     {"Deconvolution", Oddity::SizeBeyondBlock, "the resize is not looked at"},
     {"ReComplexModulatorH", Oddity::OldContentStays, "where x is empty"},
-    {"ReDZTH", Oddity::TimeFollowsNumber, "S transforms, however few values there are"},
-    {"ReDZTH_IDP", Oddity::TimeFollowsNumber, "as ReDZTH"},
-    {"CxDZTH", Oddity::TimeFollowsNumber, "as ReDZTH"},
-    {"CxDZTH_IDP", Oddity::TimeFollowsNumber, "as ReDZTH"},
+    {"GenLinEqsbySVD2011_head", Oddity::TimeFollowsNumber, "refinements that do not settle"},
 };
 
 inline bool IsKept(const char *name, Oddity oddity) {
