@@ -90,7 +90,8 @@ QX_API ErrorCode GenLinEqs2010_head(QX_IN DBL2D a, QX_IN DBL1D b, QX_OUT DBL1D x
     from 0, x is improved `refinements` times by the least-squares solution for what is left of b.
     Singular values up to the tolerance times the largest one count as 0, without the factor max(m,
     n); only a tolerance below 0 selects 2.2e-16. 0 refinements take the plain method, and a
-    negative count leaves x at 0. */
+    negative count leaves x at 0. Each costs some 4 m n operations until x comes back to an earlier
+    one, which takes a few where it converges and may take for ever where it does not. */
 QX_API ErrorCode GenLinEqsbySVD2011_head(QX_IN DBL2D a, QX_IN DBL1D b, QX_OUT DBL1D x,
                                          double tolerance, int32_t refinements, QX_OUT DBL1D work);
 

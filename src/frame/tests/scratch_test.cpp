@@ -491,15 +491,19 @@ TEST(Workspace, MayBeGivenBackWhileOthersWork) {
     std::atomic<int> faults = 0;
     std::atomic<int> served = 0;
     std::atomic<int> unexpected = 0;
+    std::atomic<int> changing = 4; // threads that still change the region
     RunThreads(8, [&](int seed) {
         std::mt19937 random(static_cast<unsigned>(seed));
-        Churn churn(static_cast<unsigned>(seed), 3, 300);
-        for (int i = 0; i < rounds; ++i) {
-            if (seed % 2 == 0) {
+        if (seed % 2 == 0) {
+            Churn churn(static_cast<unsigned>(seed), 3, 300);
+            for (int i = 0; i < rounds || changing > 0; ++i) {
                 churn.step();
                 served += analysisWorkspace.isEnabled();
-                continue;
             }
+            faults += churn.faults;
+            return;
+        }
+        for (int i = 0; i < rounds; ++i) {
             ErrorCode code = 0;
             switch (random() % 4) {
             case 0:
@@ -515,7 +519,7 @@ TEST(Workspace, MayBeGivenBackWhileOthersWork) {
                           code != ErrWorkspaceStillInUse && code != ErrWorkspaceStillEnabled &&
                           code != ErrWorkspaceNotInitialized;
         }
-        faults += churn.faults;
+        --changing;
     });
     EXPECT_EQ(faults, 0);
     EXPECT_EQ(unexpected, 0);
