@@ -130,6 +130,7 @@ ErrorCode AnalysisWorkspace::allocate(int64_t size, void **payload) {
 
     const uint64_t total = static_cast<uint64_t>(size) + blockOverhead;
     const uintptr_t thread = platform::CurrentThread();
+    noteThread(thread);
     // Room that another thread was moving while this one looked is looked for again, a few times.
     for (int look = 0; look < 8; ++look) {
         const uint64_t seen = state_.load(std::memory_order_acquire);
@@ -146,10 +147,19 @@ ErrorCode AnalysisWorkspace::allocate(int64_t size, void **payload) {
     return ErrWorkspaceExhausted;
 }
 
+void AnalysisWorkspace::noteThread(uintptr_t thread) {
+    uintptr_t first = firstThread_.load(std::memory_order_relaxed);
+    if (first == thread || (first == 0 && firstThread_.compare_exchange_strong(first, thread)))
+        return;
+    if (!servesMany_.load(std::memory_order_relaxed))
+        servesMany_.store(true, std::memory_order_relaxed);
+}
+
 bool AnalysisWorkspace::tryAllocate(State now, uint64_t total, uintptr_t thread, void **payload) {
     const bool isOurs = now.live == 0 || stackOwner_.load(std::memory_order_relaxed) == thread;
-    // A stack that has grown long beside used units is left to run empty.
-    const bool isLong = now.isShared && now.bump > limit_.load(std::memory_order_relaxed) / 4;
+    // Among many a stack that has grown long is left to run empty.
+    const bool isLong = servesMany_.load(std::memory_order_relaxed) &&
+                        now.bump > limit_.load(std::memory_order_relaxed) / 4;
     const bool stackFirst = isOurs && !isLong;
     return (stackFirst && allocateInStack(total, thread, payload)) ||
            allocateInUnits(total, thread, payload) ||
@@ -197,7 +207,7 @@ bool AnalysisWorkspace::push(uint64_t total, State *before) {
     State next;
     do {
         next = *before = unpack(seen);
-        if (before->isFull || before->live >= noRegion - 1 ||
+        if (isFull(*before) || before->live >= noRegion - 1 ||
             !fitsStack(before->bump + total, before->ceiling))
             return false;
         next.bump = static_cast<uint32_t>(before->bump + total);
@@ -228,8 +238,8 @@ namespace {
 template <class State>
 State WithoutOne(State now, uint32_t bump) {
     if (now.live == 1)
-        return {0, 0, now.ceiling, false, false};
-    return {bump, now.live - 1, now.ceiling, now.isFull, now.isShared};
+        return {0, 0, now.ceiling, false};
+    return {bump, now.live - 1, now.ceiling, now.isFull};
 }
 
 } // namespace
@@ -279,13 +289,13 @@ void AnalysisWorkspace::releaseInStack(unsigned char *base, uint32_t block) {
 }
 
 // A request that does not fit leaves the region full until the last live block goes. So it is for
-// one thread; beside used units room comes back sooner.
+// one thread; among many room comes back sooner.
 void AnalysisWorkspace::markFull(uint64_t total) {
     uint64_t seen = state_.load(std::memory_order_acquire);
     State now;
     do {
         now = unpack(seen);
-        if (now.live == 0 || now.live == noRegion || now.isShared || now.ceiling != units ||
+        if (now.live == 0 || now.live == noRegion || servesMany_.load(std::memory_order_relaxed) ||
             fitsStack(now.bump + total, now.ceiling))
             return;
         now.isFull = true;
@@ -365,11 +375,10 @@ bool AnalysisWorkspace::takeUnits(uint32_t count, uint32_t unit, uint32_t *first
     State next;
     do {
         const State now = unpack(seen);
-        if (now.live == noRegion || now.isFull || now.ceiling < count)
+        if (now.live == noRegion || isFull(now) || now.ceiling < count)
             return false;
         next = now;
         next.ceiling -= count;
-        next.isShared = now.live > 0;
         if (now.bump + uint64_t{blockOverhead} > uint64_t{next.ceiling} * unit)
             return false;
     } while (!state_.compare_exchange_weak(seen, pack(next), std::memory_order_acq_rel,
@@ -445,6 +454,8 @@ ErrorCode AnalysisWorkspace::reserve(uint32_t size) {
     base_ = static_cast<unsigned char *>(region);
     limit_.store(size, std::memory_order_relaxed);
     usedUnits_.store(~uint64_t{0}, std::memory_order_release);
+    firstThread_.store(0, std::memory_order_relaxed);
+    servesMany_.store(false, std::memory_order_relaxed);
     state_.store(pack(idle), std::memory_order_release);
     HostRegisterSweep(SweepWorkspace, nullptr, SweepForProcess);
     phase_.store(Phase::Ready);

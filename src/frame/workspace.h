@@ -18,11 +18,12 @@ namespace qx {
 // is the last, together with the run of released blocks before it; otherwise it stays until such a
 // run reaches it or until no block is live.
 //
-// That is no rule for many threads, under whose blocks everybody else's would stay for ever. The
-// stack belongs to one thread from its first live block to its last, and a thread that comes
-// meanwhile takes its blocks from the top of the region: in units, 64th parts of the region, and
-// cells, 64th parts of a unit, which one bit each tells free or used. They are free again as soon
-// as they are released, wherever they lie. The stack ends below the lowest unit in use.
+// That is no rule for many threads, under whose blocks everybody else's would stay for ever. From
+// the first request of a second thread on the region serves many: the stack belongs to one thread
+// from its first live block to its last, and a thread that comes meanwhile takes its blocks from
+// the top of the region: in units, 64th parts of the region, and cells, 64th parts of a unit, which
+// one bit each tells free or used. They are free again as soon as they are released, wherever they
+// lie. The stack ends below the lowest unit in use.
 //
 // `bump` and `live` of the stack change together, in one compare-exchange on one word. A block
 // thus counts as live from the moment it has its bytes to the moment it gives them back, and while
@@ -64,19 +65,18 @@ private:
         uint32_t live;
         uint32_t ceiling; // the units below it are the stack's
         bool isFull;      // a request was refused; lasts until no block is live
-        bool isShared;    // units have been taken since the stack was idle
     };
     static constexpr uint32_t noRegion = 0x7FFFFF; // in place of a count
     static constexpr uint64_t pack(State state) {
-        return uint64_t{state.isShared} << 63 | uint64_t{state.isFull} << 62 |
-               uint64_t{state.ceiling} << 55 | uint64_t{state.live} << 32 | state.bump;
+        return uint64_t{state.isFull} << 62 | uint64_t{state.ceiling} << 55 |
+               uint64_t{state.live} << 32 | state.bump;
     }
     static constexpr State unpack(uint64_t word) {
         return {static_cast<uint32_t>(word), static_cast<uint32_t>(word >> 32) & noRegion,
-                static_cast<uint32_t>(word >> 55) & 0x7F, (word >> 62 & 1) != 0, word >> 63 != 0};
+                static_cast<uint32_t>(word >> 55) & 0x7F, (word >> 62 & 1) != 0};
     }
-    static constexpr State idle = {0, 0, units, false, false};
-    static constexpr State absent = {0, noRegion, units, false, false};
+    static constexpr State idle = {0, 0, units, false};
+    static constexpr State absent = {0, noRegion, units, false};
 
     // Units that are used together: one whose cells serve many blocks, or several for one block,
     // whose bits are then all set. Without a used cell it is none, and nobody may set one.
@@ -88,6 +88,10 @@ private:
     enum class Phase { None, Changing, Ready };
 
     ErrorCode checkOwner() const;
+    void noteThread(uintptr_t thread);
+    bool isFull(State now) const {
+        return now.isFull && !servesMany_.load(std::memory_order_relaxed);
+    }
     bool tryAllocate(State now, uint64_t total, uintptr_t thread, void **payload);
     bool fitsStack(uint64_t end, uint32_t ceiling) const;
     bool push(uint64_t total, State *before);
@@ -107,6 +111,8 @@ private:
 
     std::atomic<uint64_t> state_ = pack(absent);
     std::atomic<uintptr_t> stackOwner_ = 0;
+    std::atomic<uintptr_t> firstThread_ = 0;         // that has asked this region
+    std::atomic<bool> servesMany_ = false;           // others have asked, too
     std::atomic<uint64_t> usedUnits_ = ~uint64_t{0}; // the stack's count as used
     Chunk chunks_[units] = {};                       // by their first unit
     std::atomic<uint8_t> latestChunk_[units] = {};   // of the threads of a hash

@@ -5,6 +5,7 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <barrier>
 #include <cstring>
 #include <functional>
 #include <limits>
@@ -466,8 +467,11 @@ TEST(Workspace, RoomForFourTimesTheLiveDataNeverRunsOut) {
     for (const auto &[most, largest] : {std::pair{2, 400}, {8, 4000}}) {
         std::atomic<int> refusals = 0;
         std::atomic<int> faults = 0;
+        std::barrier start(threads); // a thread that is alone so far follows the rule of one
         RunThreads(threads, [&](int seed) {
             Churn churn(static_cast<unsigned>(seed), static_cast<std::size_t>(most), largest);
+            churn.step();
+            start.arrive_and_wait();
             for (int i = 0; i < 1250000; ++i) // half of them requests, twice
                 churn.step();
             refusals += churn.refusals;
