@@ -113,10 +113,13 @@ public:
     // For the frame: an input that is an output of the same call reads a copy from here on.
     const void *identity() const { return this->handle_; }
     ErrorCode readCopyIn(ScratchBytes &memory, void *&block) {
+        // Scratch memory starts at any byte, the sizes of a block do not.
+        constexpr std::size_t alignment = alignof(int32_t);
         const std::size_t size = this->bytes();
-        if (const ErrorCode failed = memory.allocate(static_cast<int64_t>(size)))
+        if (const ErrorCode failed = memory.allocate(static_cast<int64_t>(size + alignment - 1)))
             return failed;
-        block = memory.bytes();
+        const std::size_t beyond = reinterpret_cast<std::uintptr_t>(memory.bytes()) % alignment;
+        block = static_cast<char *>(memory.bytes()) + (alignment - beyond) % alignment;
         std::memcpy(block, *this->handle_, size);
         this->handle_ = reinterpret_cast<typename Base::AnyHandle>(&block);
         return 0;

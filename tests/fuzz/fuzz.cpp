@@ -673,14 +673,15 @@ int Main() {
 
 } // namespace qx::test
 
+#define QX_FOR_SANITIZER __attribute__((visibility("default")))
 extern "C" {
 void __sanitizer_set_death_callback(void (*)()) __attribute__((weak));
 // Requests beyond the limit fail, as they do without a sanitizer.
-const char *__asan_default_options();
+QX_FOR_SANITIZER const char *__asan_default_options();
 const char *__asan_default_options() {
     return "allocator_may_return_null=1:max_allocation_size_mb=4";
 }
-const char *__tsan_default_options();
+QX_FOR_SANITIZER const char *__tsan_default_options();
 const char *__tsan_default_options() {
     return "allocator_may_return_null=1:max_allocation_size_mb=4";
 }
