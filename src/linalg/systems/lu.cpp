@@ -135,16 +135,17 @@ private:
 
 template <ElementType E>
 void Exchange(typename Element<E>::type *x, const I32 *pivots, int32_t n, int32_t rightSides) {
+    typedef typename Element<E>::type T;
     for (int32_t k = 0; k < n; ++k) {
         const int32_t p = pivots[k];
         if (p == k)
             continue;
         for (int32_t j = 0; j < rightSides; ++j) {
-            auto &upper = x[std::ptrdiff_t{k} * rightSides + j];
-            auto &lower = x[std::ptrdiff_t{p} * rightSides + j];
-            const auto held = upper;
-            upper = lower;
-            lower = held;
+            T *const upper = x + std::ptrdiff_t{k} * rightSides + j;
+            T *const lower = x + std::ptrdiff_t{p} * rightSides + j;
+            const T held = *upper;
+            *upper = *lower;
+            *lower = held;
         }
     }
 }

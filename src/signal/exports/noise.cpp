@@ -29,7 +29,8 @@ Outcome Gaussian(Out<DBL1D> x, int32_t n, double sigma, int32_t seed, RandomStat
         return bad;
     if (seed > 0) {
         RandomSeed(seed, *state);
-        *spare = {0, 0.0};
+        spare->hasSpare = 0; // member by member: what lies between them stays
+        spare->spare = 0.0;
     }
     GaussianNoise(x.data(), n, sigma, *state, *spare);
     return 0;

@@ -30,7 +30,8 @@ Recipe Gaussian(const char *name, int32_t seed) {
     return {name,
             [=](Call &c) {
                 auto *spare = c.record<GaussSpare>(1);
-                *spare = {1, 0.25};
+                spare->hasSpare = 1;
+                spare->spare = 0.25;
                 return Gauss(c.out<DBL>(0), c.byReference(c.n), c.byReference(2.0),
                              c.byReference(seed), c.err(), State(c), spare);
             },
