@@ -149,8 +149,7 @@ int SomeAlias(Random &random, const Scenario &scenario, std::size_t at) {
 Argument SomeArgument(Random &random, const Parameter &parameter, const Sizes &sizes,
                       bool isUsual) {
     Argument argument;
-    const auto content = static_cast<Content>(
-        random.below(isUsual || random.oneIn(2) ? usualContents : allContents));
+    const auto content = static_cast<Content>(random.below(isUsual ? usualContents : allContents));
     if (parameter.isArray()) {
         argument.rows = parameter.dimensions() == 1 ? 1 : SomeDimension(random, sizes, isUsual);
         argument.cols = SomeDimension(random, sizes, isUsual);
