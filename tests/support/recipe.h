@@ -162,6 +162,15 @@ public:
         bytes.assign(sizeof(Record), 0);
         return reinterpret_cast<Record *>(bytes.data());
     }
+    // A record with handles in it, whose layout is the platform's. It is no part of the result;
+    // what its numbers tell goes into a record of their own.
+    template <class Record>
+    Record *recordWithHandles(int number) {
+        const HeapProbe::Pause pause;
+        auto &bytes = recordsWithHandles_[number];
+        bytes.assign(sizeof(Record), 0);
+        return reinterpret_cast<Record *>(bytes.data());
+    }
 
     // By-reference inputs.
     const int32_t *byReference(int32_t value);
@@ -246,7 +255,7 @@ private:
     std::map<int, double> scalars_;
     std::map<int, CDB> complexScalars_;
     std::map<int, int32_t> integers_;
-    std::map<int, std::vector<unsigned char>> records_;
+    std::map<int, std::vector<unsigned char>> records_, recordsWithHandles_;
     std::map<int, void *> slots_;
     void *instance_ = nullptr;
     int32_t (*releaseInstance_)(void **) = nullptr;

@@ -87,6 +87,13 @@ struct FloatingPointState {
 
 void SetX87(uint16_t control) { __asm__ volatile("fldcw %0" : : "m"(control)); }
 
+// BLAS's kernels for this platform form norms in the x87 unit, at the precision that the thread has
+// set. That reaches the exports through LAPACK, whose bits are no promise (see BitsMayDiffer).
+Hashes WithoutX87(Hashes hashes) {
+    std::erase_if(hashes, [](const auto &entry) { return entry.second.mayDiffer; });
+    return hashes;
+}
+
 TEST(Caller, MaySetThePrecisionOfTheX87Unit) {
     const Hashes expected = HashEveryExport();
     const uint16_t before = FloatingPointState::Read().x87;
@@ -102,7 +109,7 @@ TEST(Caller, MaySetThePrecisionOfTheX87Unit) {
             SetX87(own);
             return result;
         });
-        ExpectEqual(expected, got, "with x87 control word " + std::to_string(control));
+        ExpectEqual(WithoutX87(expected), got, "with x87 control word " + std::to_string(control));
     }
 }
 
@@ -120,7 +127,7 @@ TEST(Caller, MayBeAThreadThatTheModuleHasNotSeen) {
     EXPECT_EQ(WaitForMultipleObjects(2, threads, TRUE, 120000), WAIT_OBJECT_0);
     for (int i = 0; i < 2; ++i) {
         CloseHandle(threads[i]);
-        ExpectEqual(expected, got[i], "in a thread");
+        ExpectEqual(WithoutX87(expected), got[i], "in a thread");
     }
 }
 

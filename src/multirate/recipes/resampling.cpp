@@ -14,6 +14,11 @@ double Bell(int32_t i) {
 }
 double Ascending(int32_t i) { return i * 0.625 + i % 3 * 0.125; }
 
+// What a state tells beside its arrays.
+struct StateNumbers {
+    double historyCount, tapScale, leftTaps, rightTaps, mode, ratio, fraction, position;
+};
+
 template <class State, ElementType Code, class Function>
 Recipe AtConstantSpacing(const char *name, Function *function, int32_t mode, int32_t reset) {
     return {name, [=](Call &c) {
@@ -23,17 +28,16 @@ Recipe AtConstantSpacing(const char *name, Function *function, int32_t mode, int
                     c.mayBeEmpty(2);
                     c.mayBeEmpty(3);
                 }
-                auto *design = c.record<ResampleDesign>(0);
+                auto *design = c.recordWithHandles<ResampleDesign>(0);
                 *design = {1.3, mode, 0.4, c.in<DBL>(1, 161, Bell), 10};
                 c.insideRecord(1);
-                auto *state = c.record<State>(1);
+                auto *state = c.recordWithHandles<State>(1);
                 *state = {c.inOut<Code>(2, 30), 5, c.inOut<DBL>(3, 40), 0, 0, 0, mode, 1.3, 0.4, 3};
                 const auto status = function(c.in<Code>(0), state, design, reset, c.out<Code>(0),
                                              c.integer(0), mode);
-                // Addresses are no result.
-                design->proto = nullptr;
-                state->history = nullptr;
-                state->taps = nullptr;
+                *c.record<StateNumbers>(0) = {state->historyCount, state->tapScale, state->leftTaps,
+                                              state->rightTaps,    state->mode,     state->ratio,
+                                              state->fraction,     state->position};
                 return status;
             }};
 }
@@ -50,7 +54,7 @@ struct AscendingTimes<CDB> {
 };
 
 VariableDesign *DesignOf(Call &c, uint8_t antiAlias) {
-    auto *design = c.record<VariableDesign>(0);
+    auto *design = c.recordWithHandles<VariableDesign>(0);
     *design = {0, antiAlias, c.in<DBL>(2, 161, Bell), 10};
     return design;
 }
@@ -63,7 +67,6 @@ Recipe AtTimes(const char *name, Function *function, uint8_t antiAlias) {
                 const auto status =
                     function(c.in<Code>(0), c.inOut<Code>(1, c.n + 9, AscendingTimes<Code>::at),
                              design, c.record<double>(1), c.integer(0), c.integer(1));
-                design->proto = nullptr;
                 return status;
             },
             TakesEmptyInput};
@@ -77,7 +80,6 @@ Recipe ChannelsAtTimes(const char *name, Function *function, uint8_t antiAlias) 
                 const auto status = function(c.in2D<Code>(0, 3, c.n), c.out2D<Code>(0),
                                              c.inOut<DBL>(1, c.n + 9, Ascending), design,
                                              c.record<double>(1), c.integer(0), c.integer(1));
-                design->proto = nullptr;
                 return status;
             },
             TakesEmptyInput};

@@ -9,6 +9,7 @@
 #include <complex>
 #include <functional>
 #include <limits>
+#include <numbers>
 #include <numeric>
 #include <vector>
 
@@ -208,7 +209,9 @@ TEST(Noises, GaussIsThePolarMethod) {
 // which numbers are used, so a factor that is off by little leaves the stream.
 TEST(Noises, RejectionsUseTheNumbersAsTold) {
     typedef long double Long;
-    const auto tangent = [](OneSequence &u) { return std::tan(M_PIl * u.next()); };
+    const auto tangent = [](OneSequence &u) {
+        return std::tan(std::numbers::pi_v<long double> * u.next());
+    };
     RandomState state = start;
     OneSequence u(start);
     for (const double value : Poisson(3000, 40.0, -1, state)) {
@@ -405,8 +408,9 @@ TEST(Noises, PeriodNoiseHasAFlatSpectrumOfIntegerAngles) {
         for (int32_t k = 0; k <= n / 2; ++k) {
             std::complex<long double> sum = 0;
             for (int32_t i = 0; i < n; ++i)
-                sum += std::polar<long double>(1, -2 * M_PIl * k * i / n) *
-                       static_cast<long double>(x[i]);
+                sum +=
+                    std::polar<long double>(1, -2 * std::numbers::pi_v<long double> * k * i / n) *
+                    static_cast<long double>(x[i]);
             const bool isHarmonic = k > 0 && 2 * k < n;
             const auto expected =
                 isHarmonic ? std::polar<long double>(amplitude * n / 2, qx::RandomInt15(reference))

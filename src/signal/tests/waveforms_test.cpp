@@ -7,6 +7,7 @@
 #include <cmath>
 #include <functional>
 #include <limits>
+#include <numbers>
 #include <string>
 #include <vector>
 
@@ -172,7 +173,8 @@ TEST(Waves, SineIsClipped) {
         phase = 30.0;
         Call(SineWaveCIN, x, n, 0.1, phase);
         ASSERT_EQ(x.size(), n);
-        EXPECT_NEAR(x[n - 1], amp * std::sin(M_PI / 6 + 0.2 * M_PI * (n - 1)), 1e-15);
+        EXPECT_NEAR(x[n - 1],
+                    amp * std::sin(std::numbers::pi / 6 + 0.2 * std::numbers::pi * (n - 1)), 1e-15);
     }
 }
 
@@ -291,12 +293,13 @@ TEST(Patterns, SineAndSinc) {
     const Samples sine = Pattern(0, SinePtrn, 90, 2.0, -30.0, 2.5);
     for (int32_t i = 0; i < 90; ++i)
         EXPECT_NEAR(sine[static_cast<std::size_t>(i)],
-                    2.0 * std::sin(2 * M_PI * 2.5 * i / 90 - M_PI / 6), 1e-13);
+                    2.0 * std::sin(2 * std::numbers::pi * 2.5 * i / 90 - std::numbers::pi / 6),
+                    1e-13);
     const Samples sinc = Pattern(0, SincWave, 9, 2.0, 1.0, 0.25);
     EXPECT_EQ(sinc[4], 2.0);
     EXPECT_NEAR(sinc[0], 0.0, 1e-16);
-    EXPECT_NEAR(sinc[2], 4 / M_PI, 1e-15);
-    EXPECT_NEAR(sinc[7], 2 * std::sin(0.75 * M_PI) / (0.75 * M_PI), 1e-15);
+    EXPECT_NEAR(sinc[2], 4 / std::numbers::pi, 1e-15);
+    EXPECT_NEAR(sinc[7], 2 * std::sin(0.75 * std::numbers::pi) / (0.75 * std::numbers::pi), 1e-15);
     Pattern(ErrSamplingNotPositive, SincWave, 9, 2.0, 1.0, 0.0);
     Pattern(ErrSamplingNotPositive, SincWave, 9, 2.0, 1.0, nan);
 }
@@ -367,10 +370,12 @@ TEST(Pulses, GaussPulseHasItsBandwidth) {
     // Its envelope's spectrum is 6 dB down at half the fractional bandwidth from fc: the envelope
     // exp(-(t/s)^2) has the spectrum exp(-(pi f s)^2).
     const double fall = std::sqrt(6.0 / 20.0 * std::log(10.0));
-    const double s = fall / (M_PI * 0.5 * 0.4 * 1.5);
+    const double s = fall / (std::numbers::pi * 0.5 * 0.4 * 1.5);
     for (std::size_t i = 0; i < x.size(); ++i) {
         const double t = Times(21)[i];
-        EXPECT_NEAR(x[i], amp * std::exp(-t * t / (s * s)) * std::cos(2 * M_PI * 1.5 * t), 1e-14);
+        EXPECT_NEAR(x[i],
+                    amp * std::exp(-t * t / (s * s)) * std::cos(2 * std::numbers::pi * 1.5 * t),
+                    1e-14);
     }
 }
 
@@ -379,7 +384,7 @@ TEST(Pulses, MonopulseIsADerivativeOfPeakAmp) {
         return GaussMonopulseH(x.handle(), n, dt, delay, 0.5, amp);
     };
     EXPECT_EQ(AtTimes(pulse, Times(21)), AtUniformTimes(pulse, 21));
-    const double peak = 0.5 / (M_PI * 0.5);
+    const double peak = 0.5 / (std::numbers::pi * 0.5);
     const double h = 1e-4;
     const Samples x = AtTimes(pulse, {-peak, 0.0, peak - h, peak, peak + h, 0.4});
     EXPECT_NEAR(x[0], -amp, 1e-15);
@@ -387,7 +392,9 @@ TEST(Pulses, MonopulseIsADerivativeOfPeakAmp) {
     EXPECT_NEAR(x[3], amp, 1e-15);
     EXPECT_LT(x[2], x[3]);
     EXPECT_LT(x[4], x[3]);
-    const auto gauss = [](double t) { return std::exp(-2 * t * t * M_PI * M_PI / 4); };
+    const auto gauss = [](double t) {
+        return std::exp(-2 * t * t * std::numbers::pi * std::numbers::pi / 4);
+    };
     const auto slope = [&](double t) { return (gauss(t + h) - gauss(t - h)) / (2 * h); };
     EXPECT_NEAR(x[5] / amp, slope(0.4) / slope(peak), 1e-7);
 }
@@ -410,7 +417,7 @@ TEST(Pulses, PeriodicSincIsAMeanOfCosines) {
     for (const int32_t order : {1, 2, 5, 6}) {
         Samples times;
         for (int32_t i = -40; i <= 40; ++i)
-            times.push_back(i * M_PI / 8);
+            times.push_back(i * std::numbers::pi / 8);
         const Samples x =
             AtTimes([=](DBLArray &y,
                         int32_t n) { return PeriodicSincH(y.handle(), n, amp, order, dt, delay); },
@@ -483,13 +490,13 @@ TEST(Modulators, ModulateASine) {
             EXPECT_EQ(FreqMod(50, step, &out[1], fc, fm, &peak[1], &phase[1]), 0);
             for (int32_t i = 0; i < 50; ++i) {
                 const double t = (block * 50 + i + 1) * step;
-                const double carrier = 2 * M_PI * fc * t + from * step;
-                ASSERT_NEAR(pm[i], std::sin(carrier + input * M_PI / 180), 1e-12);
-                ASSERT_NEAR(fm[i], std::sin(carrier + 2 * M_PI * input * t), 1e-12);
+                const double carrier = 2 * std::numbers::pi * fc * t + from * step;
+                ASSERT_NEAR(pm[i], std::sin(carrier + input * std::numbers::pi / 180), 1e-12);
+                ASSERT_NEAR(fm[i], std::sin(carrier + 2 * std::numbers::pi * input * t), 1e-12);
             }
             // kept: the last output, and not the last input, is added.
-            EXPECT_DOUBLE_EQ(out[0], phase[0] * step * 180 / M_PI + pm[49]);
-            EXPECT_DOUBLE_EQ(out[1], phase[1] * step * 180 / M_PI);
+            EXPECT_DOUBLE_EQ(out[0], phase[0] * step * 180 / std::numbers::pi + pm[49]);
+            EXPECT_DOUBLE_EQ(out[1], phase[1] * step * 180 / std::numbers::pi);
         }
         EXPECT_EQ(peak[0], input) << "25 exceeds 24";
         EXPECT_EQ(peak[1], 30.0);
@@ -504,15 +511,16 @@ TEST(Modulators, KeepTheirOddities) {
     // Two pi over the step is 2 pi: two steps of half a turn stay below it and two turns are added.
     EXPECT_EQ(PhasMod(2, 1.0, &out, 0.25, y, &peak, &phase), 0);
     EXPECT_EQ(peak, 1.0) << "1.9 and 1 have the same whole part";
-    EXPECT_NEAR(phase, 2.5 * M_PI - 2 * M_PI + 0.5 * M_PI, 1e-14);
+    EXPECT_NEAR(phase, 2.5 * std::numbers::pi - 2 * std::numbers::pi + 0.5 * std::numbers::pi,
+                1e-14);
     y[0] = -2.5;
     FreqMod(1, 1.0, &out, 0.25, y, &peak, &phase);
     EXPECT_EQ(peak, -2.5);
     phase = 0.5;
     EXPECT_EQ(PhasMod(0, 2.0, &out, 1.0, nullptr, &peak, &phase), 0);
-    EXPECT_DOUBLE_EQ(out, 180.0 / M_PI) << "without samples nothing is read";
+    EXPECT_DOUBLE_EQ(out, 180.0 / std::numbers::pi) << "without samples nothing is read";
     EXPECT_EQ(FreqMod(-7, 2.0, &out, 1.0, nullptr, &peak, &phase), 0);
-    EXPECT_DOUBLE_EQ(out, 180.0 / M_PI);
+    EXPECT_DOUBLE_EQ(out, 180.0 / std::numbers::pi);
 }
 
 } // namespace

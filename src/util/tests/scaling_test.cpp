@@ -7,6 +7,7 @@
 #include <algorithm>
 #include <cmath>
 #include <limits>
+#include <numbers>
 #include <vector>
 
 namespace {
@@ -210,7 +211,7 @@ TEST(Scaling, EmptyArraysGiveTheirCodes) {
 // A phase of large slopes, wrapped in long double: unwrapping gives it back but for whole turns.
 TEST(Unwrapping, GivesTheSmoothPhaseBack) {
     for (const int32_t mode : {0, 1, 2, 3}) {
-        const long double turn = mode < 2 ? 2 * M_PIl : 360;
+        const long double turn = mode < 2 ? 2 * std::numbers::pi_v<long double> : 360;
         for (const double slope : {0.001, 0.11, -0.3, 0.49, -0.49})
             for (const int32_t n : {1, 2, 3, 4, 5, 9, 1000}) {
                 Samples smooth;
@@ -223,7 +224,9 @@ TEST(Unwrapping, GivesTheSmoothPhaseBack) {
                 }
                 DBLArray x(wrapped);
                 EXPECT_EQ(unWrap85(x.handle(), mode), 0);
-                const double toResult = mode == 1 ? 180 / M_PI : mode == 3 ? M_PI / 180 : 1.0;
+                const double toResult = mode == 1   ? 180 / std::numbers::pi
+                                        : mode == 3 ? std::numbers::pi / 180
+                                                    : 1.0;
                 for (int32_t i = 0; i < n; ++i) {
                     const double expected = smooth[static_cast<std::size_t>(i)] * toResult;
                     ASSERT_NEAR(x[i], expected, 4e-15 * (std::fabs(expected) + 360 * toResult))
