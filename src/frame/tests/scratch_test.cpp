@@ -107,13 +107,13 @@ TEST(Scratch, ABlockMovesGrowsAndShrinksWithItsContent) {
         qx::Scratch<qx::ElementType::I32> second = std::move(first);
         EXPECT_EQ(first.data(), nullptr);
         ASSERT_EQ(second.resize(100), 0);
-        EXPECT_EQ(second[1], 6);
+        EXPECT_EQ(+second[1], 6);
         ASSERT_EQ(second.resize(1), 0);
-        EXPECT_EQ(second[0], 5);
+        EXPECT_EQ(+second[0], 5);
         ASSERT_EQ(first.allocate(1), 0);
         first[0] = 7;
         second = std::move(first);
-        EXPECT_EQ(second[0], 7);
+        EXPECT_EQ(+second[0], 7);
         // A failure gives the block up, once, wherever it lies.
         EXPECT_EQ(second.resize(10000), ErrOutOfMemory) << "more than the region has";
         EXPECT_EQ(second.data(), nullptr);

@@ -19,7 +19,8 @@ struct PositivePacked {
     int32_t n;
     double operator()(int32_t index) const {
         int32_t column = 0;
-        for (; index >= n - column; ++column)
+        // Beyond the last column, in an array that is longer than the triangle, any value will do.
+        for (; column < n - 1 && index >= n - column; ++column)
             index -= n - column;
         return PositiveDefinite{n}(column + index, column);
     }

@@ -16,7 +16,9 @@ double Ascending(int32_t i) { return i * 0.625 + i % 3 * 0.125; }
 
 // What a state tells beside its arrays.
 struct StateNumbers {
-    double historyCount, tapScale, leftTaps, rightTaps, mode, ratio, fraction, position;
+    double tapScale, ratio, fraction;
+    int32_t historyCount, leftTaps, rightTaps, mode;
+    int64_t position;
 };
 
 template <class State, ElementType Code, class Function>
@@ -35,9 +37,9 @@ Recipe AtConstantSpacing(const char *name, Function *function, int32_t mode, int
                 *state = {c.inOut<Code>(2, 30), 5, c.inOut<DBL>(3, 40), 0, 0, 0, mode, 1.3, 0.4, 3};
                 const auto status = function(c.in<Code>(0), state, design, reset, c.out<Code>(0),
                                              c.integer(0), mode);
-                *c.record<StateNumbers>(0) = {state->historyCount, state->tapScale, state->leftTaps,
-                                              state->rightTaps,    state->mode,     state->ratio,
-                                              state->fraction,     state->position};
+                *c.record<StateNumbers>(0) = {
+                    state->tapScale, state->ratio,     state->fraction, state->historyCount,
+                    state->leftTaps, state->rightTaps, state->mode,     state->position};
                 return status;
             }};
 }
