@@ -97,7 +97,7 @@ Outcome GeneralisedEigen(In<Matrix> a, In<Matrix> b, int32_t output, Out<CDB1D> 
         copies[i] = a.data()[i];
         copies[count + i] = b.data()[i];
     }
-    const auto beta = copies.data() + 2 * count;
+    typename Element<E>::type *const beta = copies.data() + 2 * count;
     if (const ErrorCode failed =
             GeneralisedSchur(copies.data(), copies.data() + count, n, schurUnordered, nullptr,
                              nullptr, values.data(), beta, withVectors ? vectors.data() : nullptr))
