@@ -464,12 +464,17 @@ void RunThreads(int threads, const std::function<void(int)> &work) {
 TEST(Workspace, RoomForFourTimesTheLiveDataNeverRunsOut) {
     constexpr int threads = 8;
     const EnabledRegion region(1 << 20);
-    for (const auto &[most, largest] : {std::pair{2, 400}, {8, 4000}}) {
+    struct Size {
+        int blocks;
+        int largest;
+    };
+    for (const Size size : {Size{2, 400}, Size{8, 4000}}) {
         std::atomic<int> refusals = 0;
         std::atomic<int> faults = 0;
         std::barrier start(threads); // a thread that is alone so far follows the rule of one
         RunThreads(threads, [&](int seed) {
-            Churn churn(static_cast<unsigned>(seed), static_cast<std::size_t>(most), largest);
+            Churn churn(static_cast<unsigned>(seed), static_cast<std::size_t>(size.blocks),
+                        size.largest);
             churn.step();
             start.arrive_and_wait();
             for (int i = 0; i < 1250000; ++i) // half of them requests, twice
@@ -477,7 +482,8 @@ TEST(Workspace, RoomForFourTimesTheLiveDataNeverRunsOut) {
             refusals += churn.refusals;
             faults += churn.faults;
         });
-        EXPECT_EQ(refusals, 0) << most << " blocks of up to " << largest << " bytes a thread";
+        EXPECT_EQ(refusals, 0) << size.blocks << " blocks of up to " << size.largest
+                               << " bytes a thread";
         EXPECT_EQ(faults, 0);
         EXPECT_EQ(analysisWorkspace.liveBlocks(), 0);
     }
