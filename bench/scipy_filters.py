@@ -81,6 +81,27 @@ class Bench:
                 signal, form, *blocks, keep, ctypes.byref(self.error)),
                 lambda: scipy.signal.sosfilt(sos, x))
 
+    def medians(self, theirs):
+        # Ours works in place, so that each call is given a copy.
+        x = self.noise.normal(size=1000000)
+        signal = self.array(x)
+        block = ctypes.cast(signal, ctypes.POINTER(ctypes.c_void_p))[0]
+
+        def ours(rank):
+            ctypes.memmove(block + 4, x.ctypes.data, x.nbytes)
+            self.module.MedianFilter81_H(signal, rank, rank)
+
+        for rank in (1, 2, 3, 5, 10, 20, 50, 100):
+            yield f"rank {rank}", lambda: ours(rank), lambda: theirs(x, 2 * rank + 1)
+
+    def least_squares(self):
+        x = self.noise.normal(size=100000)
+        for order, frame in ((2, 5), (2, 11), (3, 25), (4, 51), (5, 101), (3, 501)):
+            blocks = [self.array(x), order, frame, self.array([]), self.array([])]
+            yield (f"order {order}, frame {frame}",
+                   lambda: self.module.SavitzkyGolayFiltH(*blocks),
+                   lambda: scipy.signal.savgol_filter(x, frame, order))
+
     def images(self):
         image = self.noise.normal(size=(512, 512))
         for size in (3, 7, 15):
@@ -101,6 +122,12 @@ def main():
         scipy.signal.fftconvolve))
     bench.compare("FIR filter", "scipy.signal.lfilter", bench.fir())
     bench.compare("cascade", "scipy.signal.sosfilt", bench.cascade())
+    bench.compare("median filter, 1e6 samples", "scipy.ndimage.median_filter",
+                  bench.medians(lambda x, size: scipy.ndimage.median_filter(
+                      x, size, mode="constant")))
+    bench.compare("median filter, 1e6 samples", "scipy.signal.medfilt",
+                  bench.medians(scipy.signal.medfilt))
+    bench.compare("Savitzky-Golay filter", "scipy.signal.savgol_filter", bench.least_squares())
     bench.compare("direct convolution of matrices", "scipy.ndimage.convolve", bench.images())
 
 
