@@ -13,7 +13,7 @@ add_custom_command(OUTPUT ${QX_CATALOGUE} ${CMAKE_BINARY_DIR}/exports.map
         ${CMAKE_BINARY_DIR}/exports.def ${CMAKE_BINARY_DIR}/exports.codes ${QX_UMBRELLA}
     COMMAND ${QX_PYTHON} ${CMAKE_SOURCE_DIR}/tools/catalogue.py ${CMAKE_SOURCE_DIR}/include
         --json ${QX_CATALOGUE} --map ${CMAKE_BINARY_DIR}/exports.map --def ${CMAKE_BINARY_DIR}/exports.def
-        --codes ${CMAKE_BINARY_DIR}/exports.codes --umbrella ${QX_UMBRELLA}
+        --codes ${CMAKE_BINARY_DIR}/exports.codes --umbrella ${QX_UMBRELLA} --version ${PROJECT_VERSION}
     DEPENDS ${QX_HEADERS} ${CMAKE_SOURCE_DIR}/tools/catalogue.py
     COMMENT "Reading the exports from the public headers" VERBATIM)
 add_custom_target(catalogue ALL

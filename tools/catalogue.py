@@ -486,6 +486,7 @@ def main(arguments=None):
     parser.add_argument("--def", metavar="FILE", dest="definition")
     parser.add_argument("--codes", metavar="FILE")
     parser.add_argument("--umbrella", metavar="FILE")
+    parser.add_argument("--version", default="", help="of the library, for the catalogue")
     options = parser.parse_args(arguments)
     try:
         catalogue = read_headers(options.include)
@@ -493,7 +494,7 @@ def main(arguments=None):
         print(error, file=sys.stderr)
         return 1
     if options.json:
-        write_if_changed(options.json, json.dumps(catalogue, indent=1) + "\n")
+        write_if_changed(options.json, json.dumps({"version": options.version, **catalogue}, indent=1) + "\n")
     if options.map:
         write_if_changed(options.map, version_script(catalogue))
     if options.definition:

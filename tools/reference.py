@@ -123,8 +123,8 @@ def examples_of(family, catalogue):
     """The example files of a family."""
     families = {entry["name"]: entry["family"] for entry in catalogue["exports"]}
     for path in sorted((ROOT / "examples" / "reference").glob("*.py")):
-        called = re.search(r'qx\.call\(\s*"(\w+)"', path.read_text("utf-8"))
-        if called and families.get(called.group(1)) == family:
+        called = re.findall(r'qx\.(?:call\(\s*")?(\w+)', path.read_text("utf-8"))
+        if next((families[name] for name in called if name in families), None) == family:
             yield path
 
 
@@ -142,7 +142,7 @@ def examples_text(path):
 
 
 def write(output):
-    from qx.calls import export
+    from qx.functions import signature_text
     from qx.library import library
     lib = library()
     catalogue = lib.catalogue
@@ -162,7 +162,7 @@ def write(output):
             shown.add(path.name)
             body.append(examples_text(path))
         body.append("<h2>Exports</h2>")
-        body += [export_text(e, catalogue, lib, export(e["name"]).signature()) for e in entries]
+        body += [export_text(e, catalogue, lib, signature_text(e)) for e in entries]
         (output / f"{name}.html").write_text(page(name, "".join(body)), "utf-8")
         first = re.split(r"(?<=\.)\s", " ".join(family["introduction"].split()))[0]
         index.append(f'<h2><a href="{name}.html">{name}</a></h2><p>{marked(first)}</p>'

@@ -1,10 +1,13 @@
 """NumPy arrays as host blocks and host blocks as NumPy arrays.
 
-An array goes into a block with one copy. A block comes out as a NumPy view without any copy; the
-view keeps the block alive. Such a view, given to a call as an input, goes back in without a copy.
+An array goes into a block with one copy. A large block comes out as a NumPy view of it without any;
+the view keeps the block alive, and given to a call as an input it goes back in without a copy. The
+blocks of small arrays are kept for the next call and their content is copied out, which costs less
+than making a block and a view.
 """
 
 import ctypes
+import functools
 
 import numpy as np
 
@@ -14,100 +17,206 @@ TYPE_CODES = {"I32": 3, "U8": 5, "U32": 7, "SGL": 9, "DBL": 10, "CSG": 12, "CDB"
 DTYPES = {"I32": np.dtype(np.int32), "U8": np.dtype(np.uint8), "U32": np.dtype(np.uint32),
           "SGL": np.dtype(np.float32), "DBL": np.dtype(np.float64), "CSG": np.dtype(np.complex64),
           "CDB": np.dtype(np.complex128)}
-LARGEST = 2**31 - 1
+LARGEST = 2**31 - 1  # elements that a block can have
+SMALL = 16384  # bytes up to which a block is kept
+KEPT_SHAPES, KEPT_PER_SHAPE = 32, 4
 
-_record_dtypes = {}
 
-
+@functools.lru_cache(maxsize=None)
 def element_dtype(element):
     """The NumPy type of an element; records have their natural layout in C."""
     if element in DTYPES:
         return DTYPES[element]
-    if element not in _record_dtypes:
-        fields = library().records[element]["fields"]
-        if any("element" not in field or "count" in field for field in fields):
-            raise TypeError(f"records of type {element} hold more than plain numbers")
-        _record_dtypes[element] = np.dtype(
-            [(field["name"], DTYPES[field["element"]]) for field in fields], align=True)
-    return _record_dtypes[element]
+    fields = library().records[element]["fields"]
+    if any("element" not in field or "count" in field for field in fields):
+        raise TypeError(f"records of type {element} hold more than plain numbers")
+    return np.dtype([(field["name"], DTYPES[field["element"]]) for field in fields], align=True)
+
+
+def came(value):
+    """How a value that was given in place of an array is named in a message."""
+    if isinstance(value, np.ndarray):
+        return f"{value.ndim} of {value.dtype}"
+    if isinstance(value, (list, tuple)):
+        return f"a {type(value).__name__} of {len(value)}"
+    return f"{str(value)[:40]!r} ({type(value).__name__})"
+
+
+class _Memory:
+    """What shows memory to NumPy and does not own it."""
+
+    __slots__ = ("__array_interface__",)
 
 
 class Block:
-    """A host array: owns a handle and shows the block's present content to NumPy."""
+    """A host array: owns a handle. `shape` and `elements`, a view of a small block that does not
+    leave the package, hold until the next call has the block as an output; then show()."""
 
-    __slots__ = ("handle", "dtype", "dimensions", "_free", "__weakref__")
+    __slots__ = ("handle", "kind", "address", "shown", "sizes", "dims", "shape", "small", "elements",
+                 "_free", "__weakref__")
 
-    def __init__(self, handle, dtype, dimensions):
+    def __init__(self, handle, kind):
         if not handle:
             raise MemoryError("the host has no memory for an array of this size")
-        self.handle, self.dtype, self.dimensions = handle, dtype, dimensions
+        self.handle, self.kind = handle, kind
         self._free = library().host.QXHostFree
+        self.address = ctypes.c_void_p.from_address(handle)
+        self.show()
 
     def __del__(self):
         if hasattr(self, "_free"):
             self._free(self.handle)
 
+    def show(self):
+        self.shown = self.address.value
+        self.sizes = self.kind.fields.from_address(self.shown)
+        self.dims = self.sizes[:]
+        self.shape = tuple(self.dims)
+        interface = self.__array_interface__
+        self.small = int(np.prod(self.shape, dtype=np.int64)) * self.kind.dtype.itemsize <= SMALL
+        self.elements = None
+        if self.small:
+            memory = _Memory()
+            memory.__array_interface__ = interface
+            self.elements = np.asarray(memory)
+
+    def is_shown(self):
+        return self.address.value == self.shown and self.sizes[:] == self.dims
+
     @property
     def __array_interface__(self):
-        address = ctypes.c_void_p.from_address(self.handle).value
-        shape = tuple((ctypes.c_int32 * self.dimensions).from_address(address))
-        return {"version": 3, "shape": shape, "data": (address + 4 * self.dimensions, False),
-                "typestr": self.dtype.str, "descr": self.dtype.descr}
-
-    def view(self):
-        return np.asarray(self)
+        kind = self.kind
+        return {"version": 3, "shape": self.shape, "typestr": kind.dtype.str,
+                "descr": kind.dtype.descr, "data": (self.shown + 4 * kind.dimensions, False)}
 
 
-def empty(element, dimensions):
-    """A block of no elements, for an output."""
-    host = library().host
-    if element not in TYPE_CODES:
-        raise TypeError(f"the host cannot resize arrays of {element}")
-    handle = (host.QXHostNew1D(TYPE_CODES[element], 0) if dimensions == 1
-              else host.QXHostNew2D(TYPE_CODES[element], 0, 0))
-    return Block(handle, DTYPES[element], dimensions)
+class Kind:
+    """The arrays of one element and one number of dimensions, with the blocks that are kept. Lists
+    and dictionaries do each step under the interpreter's lock, so threads share them."""
 
+    def __init__(self, element, dimensions):
+        self.element, self.dimensions = element, dimensions
+        self.dtype = element_dtype(element)
+        self.fields = ctypes.c_int32 * dimensions
+        self.none = [0] * dimensions
+        self.kept = {}  # shape -> blocks
 
-def checked(value, dtype, dimensions, name):
-    """`value` as an array of the right number of dimensions whose cast to `dtype` loses nothing
-    but precision."""
-    array = np.asarray(value, dtype) if dtype.names and not isinstance(value, np.ndarray) \
-        else np.asarray(value)
-    if array.ndim != dimensions:
-        raise ValueError(f"{name}: an array of {dimensions} dimension{'s'[:dimensions - 1]} is "
-                         f"needed, not of {array.ndim}")
-    if array.size > LARGEST:
-        raise ValueError(f"{name}: {array.size} elements are more than an array can have")
-    if array.dtype == dtype or array.size == 0:
-        return array
-    if not np.can_cast(array.dtype, dtype, "same_kind") and not (
-            array.dtype.kind in "bui" and dtype.kind in "bui"):
-        raise TypeError(f"{name}: an array of {dtype} is needed, not of {array.dtype}")
-    if dtype.kind in "ui" and array.dtype.kind != "b":
-        limits = np.iinfo(dtype)
-        if array.min() < limits.min or array.max() > limits.max:
-            raise ValueError(f"{name}: a value lies outside {limits.min} to {limits.max}")
-    return array
-
-
-def filled(value, element, dimensions, name, reuse):
-    """A block with the content of an array. With `reuse` the block behind `value` itself, where
-    `value` shows the whole of one: only for arrays that the call leaves alone."""
-    dtype = element_dtype(element)
-    array = checked(value, dtype, dimensions, name)
-    if reuse and isinstance(array.base, Block) and array.dtype == dtype:
-        whole = array.base.__array_interface__
-        if whole["shape"] == array.shape and array.flags.c_contiguous \
-                and whole["data"][0] == array.__array_interface__["data"][0]:
+    def given(self, value, place, reuse=True):
+        """A block with the content of an array. With `reuse` the block behind `value` itself, where
+        `value` shows the whole of one: only for arrays that the call leaves alone."""
+        if type(value) is np.ndarray and value.dtype is self.dtype:
+            try:
+                block = self.kept[value.shape].pop()
+            except (KeyError, IndexError):
+                pass
+            else:
+                block.elements[...] = value
+                return block
+        array = self.checked(value, place)
+        if reuse and array.dtype == self.dtype and array.flags.c_contiguous \
+                and isinstance(array.base, Block) and array.shape == array.base.shape \
+                and array.__array_interface__["data"] == array.base.__array_interface__["data"]:
             return array.base
-    host = library().host
-    if element not in TYPE_CODES:
-        array = np.ascontiguousarray(array, dtype)
-        return Block(host.QXHostCopyRecords(dtype.itemsize, array.size, array.ctypes.data), dtype, 1)
-    direct = array.dtype == dtype and array.flags.c_contiguous
-    source = array.__array_interface__["data"][0] if direct and array.size else None
-    copy = (host.QXHostCopy1D, host.QXHostCopy2D, host.QXHostCopy3D)[dimensions - 1]
-    block = Block(copy(TYPE_CODES[element], *array.shape, source), dtype, dimensions)
-    if not direct:
-        block.view()[...] = array
-    return block
+        return self._copied(array)
+
+    def _copied(self, array):
+        try:
+            block = self.kept[array.shape].pop()
+        except (KeyError, IndexError):
+            host, element = library().host, TYPE_CODES.get(self.element)
+            if element is None:
+                array = np.ascontiguousarray(array, self.dtype)
+                return Block(host.QXHostCopyRecords(self.dtype.itemsize, array.size,
+                                                    array.ctypes.data), self)
+            direct = array.dtype == self.dtype and array.flags.c_contiguous
+            source = array.ctypes.data if direct and array.size else None
+            copy = (host.QXHostCopy1D, host.QXHostCopy2D, host.QXHostCopy3D)[self.dimensions - 1]
+            block = Block(copy(element, *array.shape, source), self)
+            if direct:
+                return block
+        np.asarray(block)[...] = array
+        return block
+
+    def checked(self, value, place):
+        """`value` as an array of the right number of dimensions whose cast to the element loses
+        nothing but precision."""
+        dtype = self.dtype
+        if isinstance(value, np.ma.MaskedArray) and np.ma.is_masked(value):
+            raise ValueError(f"{place}: {np.ma.count_masked(value)} elements are masked, and an array "
+                             "of the library has no mask: fill or compress it")
+        array = np.asarray(value, dtype) if dtype.names and not isinstance(value, np.ndarray) \
+            else np.asarray(value)
+        if array.ndim != self.dimensions:
+            raise ValueError(f"{place}: an array of {self.dimensions} dimension"
+                             f"{'s'[:self.dimensions - 1]} is needed; {came(value)} came, which has "
+                             f"{array.ndim}")
+        if array.size > LARGEST:
+            raise ValueError(f"{place}: {array.size} elements are more than an array can have")
+        if array.dtype == dtype or array.size == 0:
+            return array
+        if not np.can_cast(array.dtype, dtype, "same_kind") and not (
+                array.dtype.kind in "bui" and dtype.kind in "bui"):
+            raise TypeError(f"{place}: elements of {dtype} are needed; {array.dtype} came")
+        if dtype.kind in "ui" and array.dtype.kind != "b":
+            limits = np.iinfo(dtype)
+            if array.min() < limits.min or array.max() > limits.max:
+                raise ValueError(f"{place}: a value lies outside {limits.min} to {limits.max}")
+        return array
+
+    def give_back(self, block):
+        """After a call that had the block as an input."""
+        if block.small and self.element in TYPE_CODES:
+            self._keep(block)
+
+    def _keep(self, block):
+        kept = self.kept.get(block.shape)
+        if kept is None:
+            if len(self.kept) >= KEPT_SHAPES:
+                self.kept = {}
+            kept = self.kept.setdefault(block.shape, [])
+        if len(kept) < KEPT_PER_SHAPE:
+            kept.append(block)
+
+    def changed(self, block):
+        """The array in a block that was input and output."""
+        if not block.is_shown():
+            block.show()
+        if not block.small:
+            return np.asarray(block)
+        array = block.elements.copy()
+        self._keep(block)
+        return array
+
+    def output(self, spare):
+        """A block of no elements, for an output; `spare` has those of earlier calls."""
+        try:
+            block = spare.pop()
+        except IndexError:
+            return self.empty()
+        block.sizes[:] = self.none
+        return block
+
+    def result(self, block, spare):
+        """The array in a block that was an output."""
+        if block.address.value != block.shown or block.sizes[:] != block.dims:
+            block.show()
+        if not block.small:
+            return np.asarray(block)
+        if len(spare) < KEPT_PER_SHAPE:
+            array = block.elements.copy()
+            spare.append(block)
+            return array
+        return block.elements.copy()
+
+    def empty(self):
+        host, element = library().host, TYPE_CODES.get(self.element)
+        if element is None or self.dimensions > 2:
+            raise TypeError(f"the host cannot resize arrays of {self.element} in {self.dimensions} "
+                            "dimensions")
+        return Block(host.QXHostNew1D(element, 0) if self.dimensions == 1
+                     else host.QXHostNew2D(element, 0, 0), self)
+
+
+@functools.lru_cache(maxsize=None)
+def kind(element, dimensions):
+    return Kind(element, dimensions)

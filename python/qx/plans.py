@@ -21,11 +21,10 @@ _caches = weakref.WeakSet()
 class Word:
     """One word and how it is released."""
 
-    def __init__(self, argument):
+    def __init__(self, is_instance, is_measurement):
         self.value = ctypes.c_void_p(None)
         self.address = ctypes.addressof(self.value)
-        self._instance = argument["kind"] == "instance"
-        self._measurement = "Measure" in argument["type"]
+        self._instance, self._measurement = is_instance, is_measurement
 
     def release(self):
         if not self.value.value:
@@ -41,19 +40,22 @@ class Word:
 class Cache:
     def __init__(self):
         self.words = collections.OrderedDict()
+        self.latest = None  # the last in the order of use
         _caches.add(self)
 
-    def word(self, key, argument):
+    def word(self, key, is_instance, is_measurement):
         word = self.words.get(key)
         if word is None:
-            word = self.words[key] = Word(argument)
+            word = self.words[key] = Word(is_instance, is_measurement)
             if len(self.words) > KEPT_PER_THREAD:
                 self.words.popitem(last=False)[1].release()
-        else:
+        elif word is not self.latest:
             self.words.move_to_end(key)
+        self.latest = word
         return word
 
     def clear(self):
+        self.latest = None
         while self.words:
             self.words.popitem()[1].release()
 
@@ -68,8 +70,9 @@ class _PerThread(threading.local):
 _per_thread = _PerThread()
 
 
-def word(key, argument):
-    return _per_thread.cache.word(key, argument)
+def word(key, is_instance=False, is_measurement=False):
+    """The address of the word for a call; the key begins with the export."""
+    return _per_thread.cache.word(key, is_instance, is_measurement).address
 
 
 @atexit.register

@@ -1,7 +1,12 @@
 """Calls of exports with NumPy arrays."""
 
+import ast
+import concurrent.futures
 import gc
+import inspect
+import multiprocessing
 import os
+import pickle
 import subprocess
 import sys
 import threading
@@ -16,7 +21,7 @@ import numpy as np
 PYTHON = Path(__file__).resolve().parent.parent
 sys.path.insert(0, str(PYTHON))
 import qx  # noqa: E402
-from qx import arrays, plans  # noqa: E402
+from qx import arrays, plans, stubs  # noqa: E402
 from qx.library import library  # noqa: E402
 
 
@@ -46,42 +51,101 @@ class Arrays(unittest.TestCase):
         self.assertEqual(summary["below"], (x < -1).sum())
         self.assertEqual(qx.call("ModeH", [5.0], 0).size, 0)
 
-    def test_results_live_as_long_as_they_are_used_and_go_back_in_without_a_copy(self):
-        _, centres = qx.call("histgran_head", np.arange(100.0), 20)
-        kept = centres.copy()
-        part = centres[5:]
-        del centres
-        gc.collect()
-        others = [qx.call("histgran_head", np.arange(100.0), 20) for _ in range(50)]
-        np.testing.assert_array_equal(part, kept[5:])
-        whole = others[0][1]
-        again = arrays.filled(whole, "DBL", 1, "x", reuse=True)
-        self.assertIs(again, whole.base)
+    def test_results_live_as_long_as_they_are_used(self):
+        for bins in (20, 20_000):  # a copy, and a view of the block
+            with self.subTest(bins=bins):
+                data = np.arange(100.0)
+                _, centres = qx.histgran_head(data, bins)
+                kept = centres.copy()
+                part = centres[5:]
+                del centres
+                gc.collect()
+                others = [qx.histgran_head(data, bins) for _ in range(20)]
+                np.testing.assert_array_equal(part, kept[5:])
+                del others
+                self.assertEqual(qx.Mean_head(part), qx.Mean_head(kept[5:]))
+
+    def test_a_large_result_goes_back_in_without_a_copy(self):
+        kind = arrays.kind("DBL", 1)
+        _, whole = qx.histgran_head(np.arange(100.0), 20_000)
+        self.assertIs(kind.given(whole, "x"), whole.base)
         for other in (whole[1:], whole[::-1], whole.copy(), whole.astype(np.float32)):
-            self.assertIsNot(arrays.filled(other, "DBL", 1, "x", reuse=True), whole.base)
-        self.assertIsNot(arrays.filled(whole, "DBL", 1, "x", reuse=False), whole.base)
-        self.assertEqual(qx.call("Mean_head", part), kept[5:].mean())
+            self.assertIsNot(kind.given(other, "x"), whole.base)
+        self.assertIsNot(kind.given(whole, "x", reuse=False), whole.base)
         # A square turned about its diagonal has the shape and the address of its block, too.
-        square = qx.call("DCT_2DH", np.arange(9.0).reshape(3, 3), 0, 0)
-        self.assertIsNot(arrays.filled(square.T, "DBL", 2, "x", reuse=True), square.base)
-        np.testing.assert_allclose(qx.call("InvDCT_2DH", square.T),
-                                   np.arange(9.0).reshape(3, 3).T, atol=1e-14)
+        square = qx.DCT_2DH(np.arange(10_000.0).reshape(100, 100), 0, 0)
+        self.assertIsNot(arrays.kind("DBL", 2).given(square.T, "x"), square.base)
+        np.testing.assert_allclose(qx.InvDCT_2DH(square.T), np.arange(10_000.0).reshape(100, 100).T,
+                                   atol=1e-9)
+
+    def test_blocks_that_are_kept_hold_nothing_of_earlier_calls(self):
+        rng = np.random.default_rng(5)
+        for n in (5, 5, 3, 9, 5, 0, 5):
+            x = rng.normal(size=n)
+            if n:
+                np.testing.assert_allclose(qx.ReOXFFTH80(x, 0, n, 0), np.fft.fft(x), atol=1e-13)
+                self.assertEqual(qx.Mean_head(x.tolist()), qx.Mean_head(x))
+                continue
+            with self.assertRaises(qx.QxError) as caught:
+                qx.ReOXFFTH80(x, 0, n, 0)
+            self.assertEqual(caught.exception.results["out"].size, 0)
+        kept = arrays.kind("DBL", 1).kept
+        for n in range(1, 3 * arrays.KEPT_SHAPES):
+            qx.Mean_head(np.ones(n))
+        self.assertLessEqual(len(kept), arrays.KEPT_SHAPES)
+        self.assertTrue(all(block.small for blocks in kept.values() for block in blocks))
+
+    def test_records_with_arrays_in_them(self):
+        lower = np.array([[2.0, 0, 0], [1, 3, 0], [4, 5, 6]])
+        columns = np.triu_indices(3)  # of the transposed, which are packed by columns
+        packed = {"packed": lower.T[columns], "triangle": 0}
+        right = np.array([2.0, 4.0, 3.0])
+        np.testing.assert_array_equal(qx.Compact_to_Matrix_head(packed), lower)
+        np.testing.assert_allclose(qx.TriLinEqs_head(packed, right), np.linalg.solve(lower, right))
+        inverse = qx.Tri_InvMatrix_head(packed)
+        np.testing.assert_allclose(inverse["packed"], np.linalg.inv(lower).T[columns])
+        complex_packed = {"packed": (1 + 2j) * packed["packed"], "triangle": 0}
+        np.testing.assert_allclose(qx.CxCompact_to_Matrix_head(complex_packed), (1 + 2j) * lower)
+        for given, error, reason in (
+                ({"paked": [1.0]}, ValueError, "TriLinEqs_head: a: PackedTriangle has no field 'paked'"),
+                ({"packed": [1j]}, TypeError, r"a\.packed: elements of float64"),
+                ({"triangle": "low"}, TypeError, r"a\.triangle: a whole number is needed; 'low'"),
+                (3, TypeError, "a dictionary with fields of PackedTriangle is needed; 3")):
+            self.assertRaisesRegex(error, reason, qx.TriLinEqs_head, given, right)
 
     def test_what_would_lose_its_meaning_is_refused(self):
+        masked = np.ma.array([1.0, 2.0], mask=[False, True])
         for name, values, error, reason in (
-                ("Mean_head", [[[1.0]]], ValueError, "1 dimension"),
-                ("Mean_head", [3.0], ValueError, "1 dimension"),
-                ("Mean_head", [[1j]], TypeError, "float64 is needed"),
-                ("Mean_head", [["a"]], TypeError, "float64 is needed"),
-                ("Moment_head", [[1.0], 1.5], TypeError, "whole number"),
-                ("Moment_head", [[1.0], "2"], TypeError, "whole number"),
-                ("Moment_head", [[1.0], 2**31], ValueError, "outside"),
+                ("Mean_head", [[[1.0]]], ValueError, "Mean_head: x: an array of 1 dimension"),
+                ("Mean_head", [3.0], ValueError, "1 dimension is needed; '3.0'"),
+                ("Mean_head", [[1j]], TypeError, "elements of float64 are needed; complex128 came"),
+                ("Mean_head", [["a"]], TypeError, "elements of float64 are needed"),
+                ("Mean_head", [masked], ValueError, "Mean_head: x: 1 elements are masked"),
+                ("Moment_head", [[1.0], 1.5], TypeError, "order: a whole number is needed; 1.5"),
+                ("Moment_head", [[1.0], "2"], TypeError, r"whole number is needed; '2' \(str\)"),
+                ("Moment_head", [[1.0], 2**31], ValueError, "Moment_head: order: .* outside"),
                 ("Contingency_head", [[[1, 2], [3, 2**31]]], ValueError, "outside"),
                 ("Mean_head", [np.broadcast_to(0.0, 2**31)], ValueError, "more than an array"),
-                ("Moment_head", [[1.0]], TypeError, r"moment = qx.call\(\"Moment_head\", x, order\)"),
+                ("AllWinH", [[1.0], 1, "0.5", 0, 0], TypeError, "number is needed; '0.5'"),
+                ("AllWinH", [[1.0], 1, [0.5], 0, 0], TypeError, "number is needed; \\[0.5"),
+                ("NormDist_head", ["a"], TypeError, "NormDist_head: x: a number is needed"),
+                ("Moment_head", [[1.0]], TypeError, r"Moment_head\(\) missing .* argument: 'order'"),
                 ("Moment_hed", [[1.0], 2], LookupError, "did you mean Moment_head")):
             with self.subTest(name=name, values=values):
                 self.assertRaisesRegex(error, reason, qx.call, name, *values)
+        self.assertEqual(qx.Mean_head(np.ma.array([1.0, 3.0])), 2.0)
+
+    def test_pointers_are_those_of_exports_and_given_back_once(self):
+        plan = qx.create_oxfft_table(64)
+        self.assertTrue(plan)
+        self.assertFalse(qx.create_oxfft_table(0))
+        qx.destroy_oxfft_table(plan)
+        self.assertRaisesRegex(ValueError, "given back before", qx.destroy_oxfft_table, plan)
+        for wrong in (12345, 0.5, "x", object()):
+            self.assertRaisesRegex(TypeError, "from an export", qx.destroy_oxfft_table, wrong)
+        self.assertRaisesRegex(TypeError, "from an export", qx.SetQXRTModule, 4096, 0)
+        qx.destroy_oxfft_table(None)
+        self.assertRaises(TypeError, pickle.dumps, plan)
 
 
 class Outcomes(unittest.TestCase):
@@ -102,6 +166,23 @@ class Outcomes(unittest.TestCase):
         with warnings.catch_warnings():
             warnings.simplefilter("error", qx.QxWarning)
             self.assertRaises(qx.QxWarning, qx.call, "MSE_head", [1.0, 2.0], [1.0])
+        with self.assertWarns(qx.QxWarning) as caught:
+            qx.MSE_head([1.0, 2.0], [1.0])
+        self.assertEqual(Path(caught.filename).name, Path(__file__).name)
+
+    def test_failures_travel_between_processes(self):
+        with self.assertRaises(qx.QxError) as caught:
+            qx.histgran_head([1.0], 0)
+        error = pickle.loads(pickle.dumps(caught.exception))
+        self.assertEqual((str(error), error.code), (str(caught.exception), caught.exception.code))
+        self.assertEqual(sorted(error.results), sorted(caught.exception.results))
+        warning = pickle.loads(pickle.dumps(qx.QxWarning("MSE_head", 20004)))
+        self.assertEqual((warning.code, warning.name), (20004, "WarnLengthsDiffer"))
+        with concurrent.futures.ProcessPoolExecutor(
+                1, multiprocessing.get_context("spawn")) as processes:
+            self.assertEqual(processes.submit(qx.Mean_head, [1.0, 3.0]).result(), 2.0)
+            failed = processes.submit(qx.Mean_head, []).exception()
+        self.assertEqual((type(failed), failed.name), (qx.QxError, "ErrEmptyInput"))
 
     def test_every_code_has_its_name_and_its_own_text(self):
         codes = {n: c for n, c in library().catalogue["codes"].items() if c != 0}
@@ -243,6 +324,66 @@ class Scalars(unittest.TestCase):
         several = qx.call("QX_EllipticJ", x, 0.5)
         self.assertEqual([part.shape for part in several], 4 * [(2, 2)])
         np.testing.assert_allclose(several[0]**2 + several[1]**2, 1.0, rtol=1e-12)
+
+
+class Functions(unittest.TestCase):
+    def test_every_export_is_a_function(self):
+        stub = {node.name: node for node in ast.parse(stubs.text()).body
+                if isinstance(node, ast.FunctionDef)}
+        for name, entry in library().entries.items():
+            function = getattr(qx, name)
+            self.assertTrue(inspect.isfunction(function), name)
+            self.assertTrue(function.__doc__.startswith(entry["documentation"]), name)
+            names = [*inspect.signature(function).parameters]
+            expected = [a["name"] for a in entry["arguments"]
+                        if a["direction"] != "out" and a["kind"] not in ("slot", "instance")]
+            self.assertEqual([part.rstrip("_") for part in names], expected, name)
+            self.assertEqual([part.arg for part in stub[name].args.args], names, name)
+            self.assertEqual(ast.get_docstring(stub[name], clean=False).count("\n"),
+                             function.__doc__.count("\n"), name)
+            self.assertIs(pickle.loads(pickle.dumps(function)), function)
+        self.assertLessEqual({"Mean_head", "call", "list"}, set(dir(qx)))
+        own = {path.stem for path in (PYTHON / "qx").glob("*.py")} | set(qx.__all__)
+        self.assertEqual(own & set(qx.names()), set(), "names that hide an export")
+
+    def test_the_version_is_the_projects(self):
+        project = (PYTHON.parent / "CMakeLists.txt").read_text("utf-8")
+        self.assertIn(f"project(qxanalysis VERSION {qx.__version__} ", project)
+
+    def test_arguments_have_names(self):
+        self.assertEqual(qx.Moment_head(order=2, x=[1.0, 3.0]), 1.0)
+        self.assertEqual(qx.ReOXFFTH([1.0]).tolist(), [1])
+        self.assertRaisesRegex(TypeError, "unexpected keyword argument 'power'", qx.Moment_head,
+                               [1.0], power=2)
+
+    def test_exports_are_found_by_their_texts(self):
+        found = qx.list("variance")
+        self.assertTrue(found)
+        self.assertFalse(any("variance" in name.lower() for name in found[-1:]))
+        self.assertRegex(repr(qx.list("mean_head")), r"^Mean_head +\S.*\n?")
+        self.assertEqual(qx.list("Mean_hea?"), ["Mean_head"])
+        self.assertIn("Mean_head", qx.list("arithmetic mean") + qx.list("mean basic"))
+        self.assertRaisesRegex(qx.NoSuchExport, "Meen_hed.*did you mean .*Mean_head", qx.list, "Meen_hed")
+        self.assertRaisesRegex(AttributeError, "did you mean .*Mean_head", getattr, qx, "mean_hed")
+
+    def test_a_call_does_no_work_that_it_does_not_need(self):
+        """Counts the lines of Python that run, which is what a call costs beside the export."""
+        for name, arguments, most in (("Mean_head", (np.ones(10),), 30),
+                                      ("ReOXFFTH80", (np.ones(10), 0, 10, 0), 60)):
+            function = getattr(qx, name)
+            function(*arguments), function(*arguments)
+            lines = []
+
+            def trace(frame, event, _):
+                lines.append(event)
+                return trace
+
+            sys.settrace(trace)
+            try:
+                function(*arguments)
+            finally:
+                sys.settrace(None)
+            self.assertLess(lines.count("line"), most, name)
 
 
 class Finding(unittest.TestCase):

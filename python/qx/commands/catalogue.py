@@ -1,41 +1,30 @@
 """The commands list and show."""
 
-import fnmatch
 import textwrap
 
 
-def first_sentence(documentation):
-    text = " ".join(documentation.split())
-    end = text.find(". ")
-    return text if end < 0 else text[:end + 1]
-
-
 def list_exports(options):
+    from ..catalogue import find, summary
     from ..library import library
-    pattern = options.pattern.lower()
-    if not any(mark in pattern for mark in "*?["):
-        pattern = f"*{pattern}*"
-    found = [entry for entry in library().catalogue["exports"]
-             if fnmatch.fnmatch(entry["name"].lower(), pattern)]
-    if not found:
-        raise LookupError(f"no export is called like {options.pattern!r}")
+    entries = library().entries
     family = None
-    for entry in found:
+    for name in find(" ".join(options.pattern) or "*"):
+        entry = entries[name]
         if entry["family"] != family:
             family = entry["family"]
             print(f"{family} (qx/{family}.h)")
-        summary = textwrap.shorten(first_sentence(entry["documentation"]), 90, placeholder=" ...")
-        print(f"  {entry['name']:<30} {summary}")
+        print(f"  {name:<30} {summary(entry)}")
 
 
 def show_export(options):
-    from ..calls import export
+    from ..calls import entry as entry_of
+    from ..functions import signature_text
     from ..library import library
-    entry = export(options.name).entry
+    entry = entry_of(options.name)
     entries, families = library().entries, library().catalogue["families"]
     print(textwrap.fill(entry["declaration"], 96, subsequent_indent="    "))
     print(f"    C header {entry['header']}")
-    print(f"    Python   {export(options.name).signature()}\n")
+    print(f"    Python   {signature_text(entry)}\n")
     print(entry["documentation"])
     for name in entry["inherited"]:
         print(f"\n{name}: {entries[name]['documentation']}")
@@ -51,8 +40,8 @@ def show_export(options):
 
 
 def add(commands):
-    command = commands.add_parser("list", help="names and first sentences of the exports")
-    command.add_argument("pattern", nargs="?", default="*", help="a part of a name, or * and ?")
+    command = commands.add_parser("list", help="finds exports by words in name and text")
+    command.add_argument("pattern", nargs="*", help="words, or a name with * and ?")
     command.set_defaults(run=list_exports)
     command = commands.add_parser("show", help="declaration and documentation of an export")
     command.add_argument("name")

@@ -1,0 +1,345 @@
+"""Every export as a Python function.
+
+A function is written from the catalogue, one line for what each argument needs before the call and
+one for what it gives after it, and compiled at its first use. That makes it a plain function, with
+a signature, names for arguments and the header's text, and costs nothing at a call that the export
+does not need.
+"""
+
+import ctypes
+import keyword
+import linecache
+
+import numpy as np
+
+from . import arrays, plans
+from .library import library
+from .outcomes import tell
+from .pointers import GIVES_BACK, address, pointer
+from .records import Record
+from .scalars import C_TYPES, COMPLEX, LIMITS, c_number, real, shown, whole
+
+RESULTS = {"ErrorCode": "I32", "int32_t": "I32", "uint32_t": "U32", "uint8_t": "U8", "double": "DBL",
+           "DBL": "DBL", "float": "SGL"}
+CALLERS_WORDS = ("slot", "instance")
+
+
+def python_name(argument):
+    return argument["name"] + "_" * keyword.iskeyword(argument["name"])
+
+
+def is_given(argument):
+    return argument["direction"] != "out" and argument["kind"] not in CALLERS_WORDS
+
+
+def is_taken(argument):
+    return argument["direction"] != "in" and argument["kind"] not in (*CALLERS_WORDS, "error")
+
+
+def gives_value(entry):
+    """Whether the function result is a value and no status."""
+    return (not any(map(is_taken, entry["arguments"])) and entry["returns"] not in ("ErrorCode", "void")
+            and not any(a["kind"] == "error" for a in entry["arguments"]))
+
+
+def is_of_scalars(entry):
+    """A function of real numbers, which maps over arrays."""
+    arguments = entry["arguments"]
+    return any(map(is_given, arguments)) and entry["returns"] in (*RESULTS, "void") and all(
+        a["kind"] in ("value", "reference", "output", "error") and a["element"] not in COMPLEX
+        for a in arguments)
+
+
+def annotation(argument):
+    """The type of an argument or a result for readers and type checkers."""
+    kind, element, given = argument["kind"], argument.get("element"), argument["direction"] != "out"
+    if kind.startswith("array") or kind == "buffer":
+        if given:
+            return "ArrayLike"
+        return f"NDArray[np.{arrays.element_dtype(element).name}]"
+    if kind == "record":
+        return "Mapping[str, Any]" if given else "dict[str, Any]"
+    if kind == "opaque":
+        return "Pointer | None"
+    if kind == "procedure":
+        return "Any"
+    return "complex" if element in COMPLEX else "int" if element in LIMITS else "float"
+
+
+def result_annotation(entry):
+    taken = [annotation({**a, "direction": "out"}) for a in entry["arguments"] if is_taken(a)]
+    if not taken and gives_value(entry):
+        element = RESULTS.get(entry["returns"])
+        taken = [annotation({"kind": "value", "element": element, "direction": "out"}) if element
+                 else "Pointer"]
+    if not taken:
+        return "None"
+    return taken[0] if len(taken) == 1 else f"tuple[{', '.join(taken)}]"
+
+
+def parameters(entry):
+    """The parameters of the Python function as text."""
+    mapped = " | ArrayLike" * is_of_scalars(entry)
+    return ", ".join(f"{python_name(a)}: '{annotation(a)}{mapped}'"
+                     for a in entry["arguments"] if is_given(a))
+
+
+def returned(entry):
+    text = result_annotation(entry)
+    return f"{text} | NDArray[Any]" if is_of_scalars(entry) and "tuple" not in text else text
+
+
+def documentation(entry):
+    entries = library().entries
+    parts = [entry["documentation"]]
+    parts += [f"{name}: {entries[name]['documentation']}" for name in entry["inherited"]]
+    names = [a["name"] for a in entry["arguments"] if is_taken(a)]
+    if names:
+        parts.append(f"Gives {', '.join(names)}.")
+    return "\n\n".join(parts)
+
+
+class Writer:
+    """The source of one function and the names that it uses, which begin with an underscore."""
+
+    def __init__(self, entry):
+        self.entry, self.name = entry, entry["name"]
+        self.before, self.given, self.after, self.results = [], [], [], []
+        self.status = "_result" if entry["returns"] == "ErrorCode" else None
+        self.types = []  # of the arguments in C
+        self.names = {"__name__": "qx", "_byref": ctypes.byref, "_tell": tell, "_whole": whole,
+                      "_real": real, "_c_number": c_number, "_word": plans.word, "_Record": Record,
+                      "_address": address, "_pointer": pointer, "_buffer": buffer, "_many": many,
+                      "_mapped": mapped, "_procedure": procedure}
+        for i, argument in enumerate(entry["arguments"]):
+            kind = argument["kind"]
+            getattr(self, "_array" if kind.startswith("array") else f"_{kind}")(i, argument)
+
+    def _place(self, argument):
+        return repr(f"{self.name}: {argument['name']}")
+
+    def _array(self, i, argument):
+        self.names[f"_kind{i}"] = arrays.kind(argument["element"], int(argument["kind"][5]))
+        place, name = self._place(argument), python_name(argument)
+        if argument["direction"] == "out":
+            self.names[f"_spare{i}"] = []
+            self.before.append(f"_{i} = _kind{i}.output(_spare{i})")
+            self.results.append(f"_kind{i}.result(_{i}, _spare{i})")
+        elif argument["direction"] == "inout":
+            self.before.append(f"_{i} = _kind{i}.given({name}, {place}, False)")
+            self.results.append(f"_kind{i}.changed(_{i})")
+        else:
+            self.before.append(f"_{i} = _kind{i}.given({name}, {place})")
+            self.after.append(f"_kind{i}.give_back(_{i})")
+        self._pass(f"_{i}.handle")
+
+    def _pass(self, text, c_type=ctypes.c_void_p):
+        self.given.append(text)
+        self.types.append(c_type)
+
+    def _number(self, argument):
+        """Holds a real or whole number to its limits; the usual one without a call."""
+        name, element, place = python_name(argument), argument["element"], self._place(argument)
+        if element in LIMITS:
+            lowest, highest = LIMITS[element]
+            self.before += [f"if type({name}) is not int or not {lowest} <= {name} <= {highest}:",
+                            f"    {name} = _whole({name}, '{element}', {place})"]
+        else:
+            self.before += [f"if type({name}) is not float:", f"    {name} = _real({name}, {place})"]
+
+    def _value(self, i, argument):
+        if argument["element"] in COMPLEX:
+            raise TypeError(f"{self.name} takes a complex number by value")
+        self._number(argument)
+        self._pass(python_name(argument), C_TYPES[argument["element"]])
+
+    def _reference(self, i, argument):
+        name, element = python_name(argument), argument["element"]
+        if element in COMPLEX:
+            self.before.append(f"_{i} = _c_number({name}, '{element}', {self._place(argument)})")
+        else:
+            self._number(argument)
+            self.names[f"_type{i}"] = C_TYPES[element]
+            self.before.append(f"_{i} = _type{i}({name})")
+        self._pass(f"_byref(_{i})")
+        if argument["direction"] == "inout":
+            self._take(i, element)
+
+    _inout = _reference
+
+    def _take(self, i, element):
+        self.results.append(f"complex(*_{i})" if element in COMPLEX else f"_{i}.value")
+
+    def _output(self, i, argument):
+        self.names[f"_type{i}"] = C_TYPES[argument["element"]]
+        self.before.append(f"_{i} = _type{i}()")
+        self._pass(f"_byref(_{i})")
+        self._take(i, argument["element"])
+
+    def _error(self, i, argument):
+        self._output(i, argument)
+        self.status = self.results.pop()
+
+    def _slot(self, i, argument):
+        """What the length of a plan may depend on: the shapes of arrays, whole numbers."""
+        key = [repr(self.name), str(i)]
+        for j, other in enumerate(self.entry["arguments"]):
+            if is_given(other) and other["kind"].startswith("array"):
+                key.append(f"_{j}.shape")
+            elif is_given(other) and other.get("element") == "I32" and other["kind"] != "buffer":
+                key.append(python_name(other))
+        kinds = f"{argument['kind'] == 'instance'}, {'Measure' in argument['type']}"
+        self._pass(f"_word(({', '.join(key)}), {kinds})")
+
+    _instance = _slot
+
+    def _record(self, i, argument):
+        contents = "None" if argument["direction"] == "out" else python_name(argument)
+        self.before.append(
+            f"_{i} = _Record('{argument['element']}', {contents}, {self._place(argument)})")
+        self._pass(f"_byref(_{i}.record)")
+        if argument["direction"] != "in":
+            self.results.append(f"_{i}.contents()")
+
+    def _buffer(self, i, argument):
+        count = next(python_name(a) for a in self.entry["arguments"] if a["name"] == argument["length"])
+        self.before.append(f"_{i} = _buffer({python_name(argument)}, '{argument['element']}', {count}, "
+                           f"{self._place(argument)})")
+        self._pass(f"_{i}.ctypes.data")
+        if argument["direction"] != "in":
+            self.results.append(f"_{i}")
+
+    def _opaque(self, i, argument):
+        if argument["direction"] != "in":
+            raise TypeError(f"{self.name} gives a pointer in an argument")
+        self.before.append(f"_{i} = _address({python_name(argument)}, {argument['type']!r}, "
+                           f"{self._place(argument)}, {self.name in GIVES_BACK})")
+        self._pass(f"_{i}")
+
+    def _procedure(self, i, argument):
+        self.before.append(f"_procedure({self._place(argument)})")
+        self._pass("None")
+
+    def _mapping(self):
+        """The way of a function of numbers that is given arrays."""
+        given = [a for a in self.entry["arguments"] if is_given(a)]
+        plain = " and ".join(f"type({python_name(a)}) is {'int' if a['element'] in LIMITS else 'float'}"
+                             for a in given)
+        values = ", ".join(map(python_name, given)) + ","
+        self.names["_entry"] = self.entry
+        return [f"if not ({plain}) and _many({values}):",
+                f"    return _mapped(_entry, _function, ({values}))"]
+
+    def source(self):
+        entry = self.entry
+        lines = self._mapping() if is_of_scalars(entry) else []
+        lines += self.before
+        lines.append(f"_result = _function({', '.join(self.given)})")
+        lines += self.after
+        taken = [a["name"] for a in entry["arguments"] if is_taken(a)]
+        values = [f"_taken{i}" for i in range(len(taken))]
+        if self.status:
+            lines += [f"{value} = {text}" for value, text in zip(values, self.results)]
+            pairs = ", ".join(f"'{name}': {value}" for name, value in zip(taken, values))
+            lines += [f"_status = {self.status}"]
+            if self.status != "_result" and entry["returns"] == "int32_t":
+                lines += ["if _status == 0:", "    _status = _result"]
+            lines += ["if _status != 0:", f"    _tell('{self.name}', _status, {{{pairs}}})"]
+        else:
+            values = self.results
+        if not taken and gives_value(entry):
+            pointed = entry["returns"] not in RESULTS
+            values = [f"_pointer({entry['returns']!r}, _result)" if pointed else "_result"]
+        if values:
+            lines.append(f"return {', '.join(values)}")
+        return f"def {self.name}({parameters(entry)}) -> '{returned(entry)}':\n" + "".join(
+            f"    {line}\n" for line in lines)
+
+    def function(self):
+        c_function = getattr(library().module, self.name)
+        element = RESULTS.get(self.entry["returns"])
+        c_function.restype = (C_TYPES[element] if element else
+                              None if self.entry["returns"] == "void" else ctypes.c_void_p)
+        c_function.argtypes = self.types
+        self.names["_function"] = c_function
+        place, text = f"<qx {self.name}>", self.source()
+        linecache.cache[place] = (len(text), None, text.splitlines(True), place)
+        exec(compile(text, place, "exec"), self.names)
+        function = self.names[self.name]
+        function.__module__, function.__doc__ = "qx", documentation(self.entry)
+        return function
+
+
+def procedure(place):
+    raise TypeError(f"{place}: a procedure in C is needed, which cannot be given from Python")
+
+
+def buffer(value, element, count, place):
+    """A copy as memory behind a plain pointer, which has no length of its own: the count is held
+    against the array."""
+    kind = arrays.kind(element, 1)
+    array = np.array(kind.checked(value, place), kind.dtype)
+    if array.size < count:
+        raise ValueError(f"{place}: {count} elements are needed; {array.size} came")
+    return array
+
+
+def many(*values):
+    """Whether one of the values is no single number."""
+    return any(np.ndim(value) for value in values)
+
+
+def mapped(entry, function, values):
+    """A function of scalars over arrays, element by element, with NumPy's broadcasting. The
+    function writes straight into the elements of the result."""
+    given = [a for a in entry["arguments"] if is_given(a)]
+    checked = []
+    for value, a in zip(values, given):
+        place = f"{entry['name']}: {a['name']}"
+        if isinstance(value, (str, bytes)):
+            raise TypeError(f"{place}: a number is needed; {shown(value)} came")
+        checked.append(arrays.kind(a["element"], np.ndim(value)).checked(value, place))
+    spread = np.broadcast_arrays(*checked)
+    shape, n = spread[0].shape, spread[0].size
+    spread = iter(spread)
+    columns, kept, results, codes = [], [], [], None
+    for argument in entry["arguments"]:
+        dtype = arrays.element_dtype(argument["element"])
+        if is_given(argument):
+            data = np.ascontiguousarray(next(spread), dtype).ravel()
+            if argument["kind"] == "value":
+                columns.append(data.tolist())
+                continue
+        else:
+            data = np.zeros(n, dtype)
+        if argument["kind"] == "error":
+            codes = data
+        elif argument["direction"] == "out":
+            results.append(data.reshape(shape))
+        kept.append(data)  # only its address goes into the calls
+        start = data.ctypes.data
+        columns.append(range(start, start + n * dtype.itemsize, dtype.itemsize))
+    found = [function(*row) for row in zip(*columns)]
+    if entry["returns"] == "ErrorCode":
+        codes = np.array(found, np.int32)
+    if codes is not None:
+        _tell_first(entry["name"], codes)
+    if gives_value(entry):
+        return np.array(found, None if n else float).reshape(shape)
+    return results[0] if len(results) == 1 else tuple(results)
+
+
+def _tell_first(name, codes):
+    failed = np.flatnonzero(codes < 0)
+    if len(failed):
+        tell(name, int(codes[failed[0]]), None, f" at element {failed[0]}")
+    for code in np.unique(codes[codes > 0]):
+        tell(name, int(code), None)
+
+
+def signature_text(entry):
+    """How the export is called from Python, for readers."""
+    results = [a["name"] for a in entry["arguments"] if is_taken(a)] or (
+        ["value"] if gives_value(entry) else [])
+    names = ", ".join(python_name(a) for a in entry["arguments"] if is_given(a))
+    return (", ".join(results) + " = " if results else "") + f"qx.{entry['name']}({names})"

@@ -1,0 +1,60 @@
+"""Builds the Python package: the module and the stand-in host go into it, with their catalogue and
+the stubs made from it. What they need to be built is what ./run installs."""
+
+import os
+import re
+import shutil
+import subprocess
+import sys
+from pathlib import Path
+
+from setuptools import setup
+from setuptools.command.build_py import build_py
+from wheel.bdist_wheel import bdist_wheel
+
+ROOT = Path(__file__).resolve().parent
+BUILD = ROOT / "build"
+VERSION = re.search(r"project\(qxanalysis VERSION (\S+)", (ROOT / "CMakeLists.txt").read_text("utf-8"))
+
+
+def libraries():
+    """The folder of the built libraries: QX_LIBRARY_DIR, or the release build, made up to date."""
+    if os.environ.get("QX_LIBRARY_DIR"):
+        return Path(os.environ["QX_LIBRARY_DIR"])
+    release = BUILD / "release"
+    if not (release / "build.ninja").exists():
+        subprocess.run(["cmake", "--preset", "release"], cwd=ROOT, check=True)
+    subprocess.run(["cmake", "--build", release, "--target", "qxanalysis", "qxrt"], check=True)
+    return release
+
+
+class WithLibraries(build_py):
+    def run(self):
+        super().run()
+        if self.editable_mode:
+            libraries()  # the package finds them in the tree
+            return
+        package = Path(self.build_lib) / "qx"
+        for name in ("libqxanalysis.so", "libqxrt.so", "catalogue.json"):
+            shutil.copy(libraries() / name, package)
+        subprocess.run([sys.executable, "-m", "qx.stubs", package / "__init__.pyi"], check=True,
+                       env={**os.environ, "PYTHONPATH": os.pathsep.join(
+                           [self.build_lib, *filter(None, sys.path)]), "QX_LIBRARY_DIR": ""})
+
+
+class OfThisPlatform(bdist_wheel):
+    """For any Python 3, but for one platform."""
+
+    def finalize_options(self):
+        super().finalize_options()
+        self.root_is_pure = False
+
+    def get_tag(self):
+        return "py3", "none", super().get_tag()[2]
+
+
+(BUILD / "python").mkdir(parents=True, exist_ok=True)
+setup(version=VERSION[1], package_dir={"": "python"}, packages=["qx", "qx.commands"],
+      package_data={"qx": ["py.typed"]},
+      cmdclass={"build_py": WithLibraries, "bdist_wheel": OfThisPlatform},
+      options={"egg_info": {"egg_base": "build/python"}, "build": {"build_base": "build/python"}})
