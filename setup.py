@@ -8,13 +8,13 @@ import subprocess
 import sys
 from pathlib import Path
 
-from setuptools import setup
+from setuptools import Distribution, setup
 from setuptools.command.build_py import build_py
 from wheel.bdist_wheel import bdist_wheel
 
 ROOT = Path(__file__).resolve().parent
 BUILD = ROOT / "build"
-VERSION = re.search(r"project\(qxanalysis VERSION (\S+)", (ROOT / "CMakeLists.txt").read_text("utf-8"))
+PROJECT = (ROOT / "CMakeLists.txt").read_text("utf-8")
 
 
 def libraries():
@@ -42,19 +42,21 @@ class WithLibraries(build_py):
                            [self.build_lib, *filter(None, sys.path)]), "QX_LIBRARY_DIR": ""})
 
 
-class OfThisPlatform(bdist_wheel):
-    """For any Python 3, but for one platform."""
+class HasLibraries(Distribution):
+    def has_ext_modules(self):
+        return True
 
-    def finalize_options(self):
-        super().finalize_options()
-        self.root_is_pure = False
+
+class OfThisPlatform(bdist_wheel):
+    """For any Python 3: the libraries do not know which one loads them."""
 
     def get_tag(self):
         return "py3", "none", super().get_tag()[2]
 
 
 (BUILD / "python").mkdir(parents=True, exist_ok=True)
-setup(version=VERSION[1], package_dir={"": "python"}, packages=["qx", "qx.commands"],
+setup(version=re.search(r"project\(qxanalysis VERSION (\S+)", PROJECT)[1], distclass=HasLibraries,
+      package_dir={"": "python"}, packages=["qx", "qx.commands"],
       package_data={"qx": ["py.typed"]},
       cmdclass={"build_py": WithLibraries, "bdist_wheel": OfThisPlatform},
       options={"egg_info": {"egg_base": "build/python"}, "build": {"build_base": "build/python"}})

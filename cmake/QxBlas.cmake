@@ -1,7 +1,7 @@
 # BLAS and LAPACK that the module carries: built from source once, static, free of threads and
 # safe to call from several. Only src/linalg/lapack.cpp includes their headers.
 foreach(library IN ITEMS lapack openblas)
-    execute_process(COMMAND ${CMAKE_SOURCE_DIR}/tools/setup/${library} ${QX_LIBM_KIND}
+    execute_process(COMMAND ${PROJECT_SOURCE_DIR}/tools/setup/${library} ${QX_LIBM_KIND}
         OUTPUT_VARIABLE archive OUTPUT_STRIP_TRAILING_WHITESPACE RESULT_VARIABLE failed)
     if(failed)
         message(FATAL_ERROR "${library} is missing: tools/setup/${library} ${QX_LIBM_KIND} failed")

@@ -5,27 +5,27 @@ find_program(QX_PYTHON NAMES python3 PATHS /usr/bin NO_DEFAULT_PATH)
 if(NOT QX_PYTHON)
     find_program(QX_PYTHON NAMES python3 REQUIRED)
 endif()
-file(GLOB QX_HEADERS CONFIGURE_DEPENDS ${CMAKE_SOURCE_DIR}/include/qx/*.h)
+file(GLOB QX_HEADERS CONFIGURE_DEPENDS ${PROJECT_SOURCE_DIR}/include/qx/*.h)
 # The header that includes all others is written, too, and found beside them.
-set(QX_UMBRELLA ${CMAKE_BINARY_DIR}/include/qx/qx.h)
-set(QX_CATALOGUE ${CMAKE_BINARY_DIR}/catalogue.json)
-add_custom_command(OUTPUT ${QX_CATALOGUE} ${CMAKE_BINARY_DIR}/exports.map
-        ${CMAKE_BINARY_DIR}/exports.def ${CMAKE_BINARY_DIR}/exports.codes ${QX_UMBRELLA}
-    COMMAND ${QX_PYTHON} ${CMAKE_SOURCE_DIR}/tools/catalogue.py ${CMAKE_SOURCE_DIR}/include
-        --json ${QX_CATALOGUE} --map ${CMAKE_BINARY_DIR}/exports.map --def ${CMAKE_BINARY_DIR}/exports.def
-        --codes ${CMAKE_BINARY_DIR}/exports.codes --umbrella ${QX_UMBRELLA} --version ${PROJECT_VERSION}
-    DEPENDS ${QX_HEADERS} ${CMAKE_SOURCE_DIR}/tools/catalogue.py
+set(QX_UMBRELLA ${PROJECT_BINARY_DIR}/include/qx/qx.h)
+set(QX_CATALOGUE ${PROJECT_BINARY_DIR}/catalogue.json)
+add_custom_command(OUTPUT ${QX_CATALOGUE} ${PROJECT_BINARY_DIR}/exports.map
+        ${PROJECT_BINARY_DIR}/exports.def ${PROJECT_BINARY_DIR}/exports.codes ${QX_UMBRELLA}
+    COMMAND ${QX_PYTHON} ${PROJECT_SOURCE_DIR}/tools/catalogue.py ${PROJECT_SOURCE_DIR}/include
+        --json ${QX_CATALOGUE} --map ${PROJECT_BINARY_DIR}/exports.map --def ${PROJECT_BINARY_DIR}/exports.def
+        --codes ${PROJECT_BINARY_DIR}/exports.codes --umbrella ${QX_UMBRELLA} --version ${PROJECT_VERSION}
+    DEPENDS ${QX_HEADERS} ${PROJECT_SOURCE_DIR}/tools/catalogue.py
     COMMENT "Reading the exports from the public headers" VERBATIM)
 add_custom_target(catalogue ALL
-    DEPENDS ${QX_CATALOGUE} ${CMAKE_BINARY_DIR}/exports.map ${CMAKE_BINARY_DIR}/exports.def
-        ${CMAKE_BINARY_DIR}/exports.codes ${QX_UMBRELLA})
+    DEPENDS ${QX_CATALOGUE} ${PROJECT_BINARY_DIR}/exports.map ${PROJECT_BINARY_DIR}/exports.def
+        ${PROJECT_BINARY_DIR}/exports.codes ${QX_UMBRELLA})
 
 # Windows shows what is marked for export and nothing else; elsewhere the linker is told.
 function(qx_show_exports_only target)
     add_dependencies(${target} catalogue)
     if(NOT WIN32)
         target_link_options(${target} PRIVATE -Wl,--exclude-libs,ALL
-            -Wl,--version-script=${CMAKE_BINARY_DIR}/exports.map)
-        set_target_properties(${target} PROPERTIES LINK_DEPENDS ${CMAKE_BINARY_DIR}/exports.map)
+            -Wl,--version-script=${PROJECT_BINARY_DIR}/exports.map)
+        set_target_properties(${target} PROPERTIES LINK_DEPENDS ${PROJECT_BINARY_DIR}/exports.map)
     endif()
 endfunction()

@@ -54,7 +54,7 @@ function(qx_compile_for_avx2 family)
     target_compile_definitions(${family}_avx2 PRIVATE QX_WIDTH=avx2)
     target_compile_options(${family}_avx2 PRIVATE -mavx2 -mno-fma -mno-avx512f
         $<$<CXX_COMPILER_ID:GNU>:-fno-weak> $<$<CXX_COMPILER_ID:GNU>:-w>)
-    target_include_directories(${family}_avx2 PRIVATE ${CMAKE_SOURCE_DIR}/src ${CMAKE_SOURCE_DIR}/include)
+    target_include_directories(${family}_avx2 PRIVATE ${PROJECT_SOURCE_DIR}/src ${PROJECT_SOURCE_DIR}/include)
     target_link_libraries(${family}_avx2 PRIVATE qxflags)
     target_sources(qxcore PRIVATE $<TARGET_OBJECTS:${family}_avx2>)
     set_property(GLOBAL APPEND PROPERTY QX_AVX2_TARGETS ${family}_avx2)

@@ -6,7 +6,7 @@ if(WIN32)
 else()
     set(QX_LIBM_KIND linux)
 endif()
-execute_process(COMMAND ${CMAKE_SOURCE_DIR}/tools/setup/libm ${QX_LIBM_KIND}
+execute_process(COMMAND ${PROJECT_SOURCE_DIR}/tools/setup/libm ${QX_LIBM_KIND}
     OUTPUT_VARIABLE QX_LIBM_ARCHIVE OUTPUT_STRIP_TRAILING_WHITESPACE RESULT_VARIABLE failed)
 if(failed)
     message(FATAL_ERROR "The mathematics library is missing: tools/setup/libm ${QX_LIBM_KIND} failed")

@@ -24,12 +24,12 @@ class Library:
     """Both libraries, loaded once. The host comes first: the module looks for it by name among
     the libraries of the process."""
 
-    def __init__(self, folder):
+    def __init__(self, folder, catalogue):
         module_name, host_name = NAMES
         self.folder = folder
         self.host = ctypes.CDLL(str(folder / host_name))
         self.module = ctypes.CDLL(str(folder / module_name))
-        self.catalogue = json.loads((folder / "catalogue.json").read_text("utf-8"))
+        self.catalogue = json.loads(catalogue.read_text("utf-8"))
         self.entries = {entry["name"]: entry for entry in self.catalogue["exports"]}
         self.records = self.catalogue["records"]
         self._declare_host()
@@ -68,10 +68,12 @@ def folders():
 
 @functools.lru_cache(maxsize=None)
 def library():
-    needed = [*NAMES, "catalogue.json"]
     for folder in folders():
-        if all((folder / name).exists() for name in needed):
-            return Library(folder)
+        # Beside the libraries, or where an installation has it.
+        for catalogue in (folder / "catalogue.json",
+                          *(prefix / "share/qxanalysis/catalogue.json" for prefix in [*folder.parents][:2])):
+            if catalogue.exists() and all((folder / name).exists() for name in NAMES):
+                return Library(folder, catalogue)
     places = ", ".join(str(folder) for folder in folders())
-    raise NotBuilt(f"{', '.join(needed)} not found in {places}: build them with ./run, or name "
-                   "their folder in QX_LIBRARY_DIR")
+    raise NotBuilt(f"{', '.join(NAMES)} and catalogue.json not found in {places}: build them with "
+                   "./run, or name their folder in QX_LIBRARY_DIR")
