@@ -1,0 +1,102 @@
+#ifndef QX_MODEL_FITS_H
+#define QX_MODEL_FITS_H
+
+/* Least-squares fits of an exponential, a power, a logarithm and a Gaussian peak. Weights are empty
+   or one per sample, count by their absolute values, and count as none where all are 0; the mean
+   squared error (MSE) is that of qx/linear_fits.h. `tolerance` ends an iteration when the MSE
+   changes by less than this part of itself, `floor` when it is no larger; 0 or below select 0.0001
+   and 1e-12. *iterations is the limit on entry, of which a negative one allows no step, and the
+   number of steps on return. A guess has one value for each coefficient; of a longer one the first
+   values count, a shorter one counts as none, and both give a warning. A failure empties y where it
+   is an output and makes the numbers NaN. */
+
+#include "qx/types.h"
+
+QX_BEGIN_DECLS
+
+/** y = a exp(b x) by the line through (x, ln |y|) with weights w y^2, which make up for the
+    logarithm; its values take the place of y. Samples without the sign of most do not count. The
+    weights are 1 / sd^2, and 1 where sd is 0.
+    Codes: ErrSizeMismatch (the arrays differ in length), ErrFewerThanTwo (less than two samples),
+    ErrNonFiniteInput (a weight is NaN, or a sample not finite), ErrTooFewWeights (all weights but
+    one are 0), ErrPolynomialOrderTooHigh (less than two values have the sign of most),
+    ErrOutOfMemory (no memory), ErrIterationLimit (singular values do not converge). */
+QX_API ErrorCode ExpFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D deviations,
+                             QX_OUT double *a, QX_OUT double *b, QX_OUT double *mse);
+/** y = a exp(b x), with weights as they are. Method 0 is that of ExpFit_head, which leaves
+    *iterations; any other goes on from there, or from the guess (a, b), by Gauss-Newton steps and
+    takes the best. A guess that is not finite gives NaN.
+    Codes: ErrSizeMismatch (the arrays differ in length), ErrFewerThanTwo (less than two samples),
+    ErrNonFiniteInput (a weight is NaN, or a sample or a step's exponential not finite),
+    ErrTooFewWeights (all weights but one are 0), ErrPolynomialOrderTooHigh (less than two values
+    have the sign of most), ErrOutOfMemory (no memory), ErrIterationLimit (singular values do not
+    converge), WarnFitIncomplete (the guess has neither no values nor two). */
+QX_API ErrorCode ExpFit80_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, double tolerance,
+                               QX_IN DBL1D guess, uint16_t method, QX_OUT double *a,
+                               QX_OUT double *b, QX_OUT double *mse, QX_INOUT int32_t *iterations,
+                               double floor);
+/** As ExpFit_head, for the coefficients alone and without weights.
+    Codes: ErrSizeMismatch (the arrays differ in length), ErrFewerThanTwo (less than two samples),
+    ErrPolynomialOrderTooHigh (less than two values have the sign of most), ErrNonFiniteInput (a
+    sample is not finite), ErrOutOfMemory (no memory), ErrIterationLimit (singular values do not
+    converge). */
+QX_API ErrorCode ExpFitCoef_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_OUT double *a, QX_OUT double *b);
+/** As ExpFit80_head, for the coefficients alone. */
+QX_API ErrorCode ExpFitCoef80_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, int32_t method,
+                                   double tolerance, QX_IN DBL1D guess, QX_OUT double *a,
+                                   QX_OUT double *b, QX_INOUT int32_t *iterations, double floor);
+
+/** y = a x^b for x above 0, by Gauss-Newton steps from the guess (a, b), or from the line through
+    (ln x, ln |y|) with weights w y^2; the best step wins and its values take the place of y. A guess
+    that is not finite gives NaN.
+    Codes: ErrSizeMismatch (the arrays differ in length), ErrFewerThanTwo (less than two samples),
+    ErrNonFiniteInput (a weight is NaN, or a sample or a step's power not finite), ErrTooFewWeights
+    (all weights but one are 0), ErrNotStrictlyPositive (an x is not above 0),
+    ErrPolynomialOrderTooHigh (less than two values have the sign of most), ErrOutOfMemory (no
+    memory), ErrIterationLimit (singular values do not converge), WarnFitIncomplete (the guess has
+    neither no values nor two). */
+QX_API ErrorCode PowerFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, double tolerance,
+                               QX_IN DBL1D guess, QX_OUT double *a, QX_OUT double *b,
+                               QX_OUT double *mse, QX_INOUT int32_t *iterations, double floor);
+/** As PowerFit_head, for the coefficients alone. */
+QX_API ErrorCode PowerFitCoef_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, double tolerance,
+                                   QX_IN DBL1D guess, QX_OUT double *a, QX_OUT double *b,
+                                   QX_INOUT int32_t *iterations, double floor);
+
+/** y = a log(b x) to the given base, for x of one sign, which b takes; its values take the place of
+    y. In closed form by the line through (log |x|, y). The base 2.71828, these six digits, stands
+    for e; e in all its digits is a base like any other and differs in the last bits.
+    Codes: ErrSizeMismatch (the arrays differ in length), ErrNotStrictlyPositive (the base is 0 or
+    below), ErrFewerThanTwo (less than two samples), ErrNonFiniteInput (a weight is NaN),
+    ErrTooFewWeights (all weights but one are 0), ErrMixedSigns (the x are neither all above nor all
+    below 0), ErrOutOfMemory (no memory). */
+QX_API ErrorCode LogFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, double base,
+                             QX_OUT double *a, QX_OUT double *b, QX_OUT double *mse);
+/** As LogFit_head, for the coefficients alone. */
+QX_API ErrorCode LogFitCoef_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, double base,
+                                 QX_OUT double *a, QX_OUT double *b);
+
+/** y = a exp(-((x - c) / s)^2 / 2), a peak up or down, by steepest descent with halved steps from
+    the guess (a, c, s), or from the logarithms of what lies above a tenth of the peak; its values
+    take the place of y. *iterations counts the trials. Steepest descent converges slowly where the
+    sizes of a, c and s differ much, and ends by the tolerance then. A guess that is not finite counts
+    as none. A peak that alone lies above a tenth of its height is taken through three points, and
+    *iterations is 0.
+    Codes: ErrSizeMismatch (the arrays differ in length), ErrFewerThanThree (less than three
+    samples), ErrNonFiniteInput (a weight is NaN, or an x not finite), ErrTooFewWeights (less than
+    three weights are not 0), ErrFitStartValues (the deviation to start from is 0, or a lone peak
+    has no neighbour of its sign on a side), ErrOutOfMemory (no memory), WarnFitIncomplete (the
+    guess has neither no values nor three). */
+QX_API ErrorCode GaussianPeakFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w,
+                                      double tolerance, QX_IN DBL1D guess, QX_OUT double *a,
+                                      QX_OUT double *c, QX_OUT double *s, QX_OUT double *mse,
+                                      QX_INOUT int32_t *iterations, double floor);
+/** As GaussianPeakFit_head, for the coefficients alone. */
+QX_API ErrorCode GaussianPeakFitCoef_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w,
+                                          double tolerance, QX_IN DBL1D guess, QX_OUT double *a,
+                                          QX_OUT double *c, QX_OUT double *s,
+                                          QX_INOUT int32_t *iterations, double floor);
+
+QX_END_DECLS
+
+#endif

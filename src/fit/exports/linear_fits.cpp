@@ -1,0 +1,179 @@
+#include "qx/linear_fits.h"
+
+#include "fit/damped_step.h"
+#include "fit/exports/fit_arguments.h"
+#include "fit/general.h"
+#include "fit/line.h"
+#include "fit/polynomial.h"
+#include "fit/residuals.h"
+
+#include <cstring>
+
+namespace qx {
+namespace {
+
+template <class Gives, class Weights>
+Outcome Line(typename Gives::Y y, In<DBL1D> x, Weights w, OutDBL slope, OutDBL intercept,
+             typename Gives::MSE mse) {
+    if (x.size() != y.size() || !WeightsFit(w, y.size()))
+        return ErrSizeMismatch;
+    return FitLine(x.data(), y.data(), y.size(), WeightsOf(w), Gives::fit(y), slope.address(),
+                   intercept.address(), Gives::mse(mse));
+}
+
+// What the revisions of the polynomial fit have added to its arguments.
+struct PolynomialTerms {
+    const DBL *w;
+    const I32 *fixedOrders;
+    const DBL *fixedValues;
+    int32_t fixedCount;
+};
+
+Outcome FitTerms(In<DBL1D> x, In<DBL1D> y, int32_t order, int32_t algorithm,
+                 const PolynomialTerms &terms, Out<DBL1D> fit, Out<DBL1D> coefficients,
+                 OutDBL mse) {
+    const int32_t n = x.size();
+    if (y.size() != n)
+        return ErrSizeMismatch;
+    if (const ErrorCode failed = CheckPolynomialOrder(n, order, terms.fixedCount))
+        return failed;
+    if (order == std::numeric_limits<int32_t>::max())
+        return ErrOutOfMemory;
+    if (const Outcome bad = fit.resize(n))
+        return bad;
+    if (const Outcome bad = coefficients.resize(order + 1))
+        return bad;
+    return FitPolynomial(x.data(), y.data(), terms.w, n, order, algorithm, terms.fixedOrders,
+                         terms.fixedValues, terms.fixedCount, fit.data(), coefficients.data(),
+                         mse.address());
+}
+
+Outcome FitPoly(In<DBL1D> x, In<DBL1D> y, int32_t order, int32_t algorithm, Out<DBL1D> fit,
+                Out<DBL1D> coefficients, OutDBL mse) {
+    return FitTerms(x, y, order, algorithm, {}, fit, coefficients, mse);
+}
+
+Outcome FitPolyWithFixed(In<DBL1D> x, In<DBL1D> y, int32_t order, int32_t algorithm,
+                         In<I32_1D> fixedOrders, In<DBL1D> fixedValues, Out<DBL1D> fit,
+                         Out<DBL1D> coefficients, OutDBL mse) {
+    if (fixedOrders.size() != fixedValues.size())
+        return ErrSizeMismatch;
+    return FitTerms(x, y, order, algorithm,
+                    {nullptr, fixedOrders.data(), fixedValues.data(), fixedOrders.size()}, fit,
+                    coefficients, mse);
+}
+
+Outcome FitPolyWeighted(In<DBL1D> x, In<DBL1D> y, int32_t order, In<DBL1D> w, int32_t algorithm,
+                        In<I32_1D> fixedOrders, In<DBL1D> fixedValues, Out<DBL1D> fit,
+                        Out<DBL1D> coefficients, OutDBL mse) {
+    if (!WeightsFit(w, x.size()) || fixedOrders.size() != fixedValues.size())
+        return ErrSizeMismatch;
+    return FitTerms(x, y, order, algorithm,
+                    {WeightsOf(w), fixedOrders.data(), fixedValues.data(), fixedOrders.size()}, fit,
+                    coefficients, mse);
+}
+
+template <Given given>
+Outcome FitMatrix(In<DBL2D> h, In<DBL1D> y, In<DBL1D> w, int32_t algorithm, int32_t wantCovariance,
+                  Out<DBL1D> coefficients, Out<DBL1D> fit, Out<DBL2D> covariance, OutDBL mse) {
+    const int32_t k = h.cols(), side = wantCovariance != 0 ? k : 0;
+    if (y.size() != h.rows() || !WeightsFit(w, y.size()))
+        return ErrSizeMismatch;
+    if (const Outcome bad = coefficients.resize(k))
+        return bad;
+    if (const Outcome bad = fit.resize(y.size()))
+        return bad;
+    if (const Outcome bad = covariance.resize(side, side))
+        return bad;
+    SampleWeights weights;
+    if (const ErrorCode failed = weights.make(w, given))
+        return failed;
+    return FitGeneral(h.data(), h.rows(), k, y.data(), weights.data(), coefficients.data(),
+                      fit.data(), mse.address(), side > 0 ? covariance.data() : nullptr, algorithm);
+}
+
+Outcome ScoreFit(In<DBL1D> y, In<DBL1D> fit, In<DBL1D> w, int32_t dof, OutDBL sse, OutDBL rSquare,
+                 OutDBL rmse) {
+    if (const Outcome bad =
+            FirstFailed({{y.isEmpty(), ErrEmptyInput},
+                         {fit.size() != y.size() || !WeightsFit(w, y.size()), ErrSizeMismatch}}))
+        return bad;
+    return GoodnessOfFit(y.data(), fit.data(), WeightsOf(w), y.size(), dof, sse.address(),
+                         rSquare.address(), rmse.address());
+}
+
+Outcome DampedStep(InOut<DBL1D> coefficients, In<DBL2D> a, In<DBL1D> gradient,
+                   const double *lambda) {
+    const int32_t n = coefficients.size();
+    if (n < 1 || a.rows() != n || a.cols() != n || gradient.size() != n)
+        return ErrEmptyInput;
+    const int64_t square = int64_t{n} * n;
+    Scratch<ElementType::DBL> memory;
+    if (const ErrorCode failed = memory.allocate(square + n))
+        return failed;
+    DBL *const g = memory.data() + square;
+    std::memcpy(memory.data(), a.data(), static_cast<std::size_t>(square) * sizeof(DBL));
+    std::memcpy(g, gradient.data(), static_cast<std::size_t>(n) * sizeof(DBL));
+    return AddDampedStep(memory.data(), g, n, *lambda, coefficients.data());
+}
+
+} // namespace
+} // namespace qx
+
+using qx::CoefficientsOnly;
+using qx::Given;
+using qx::In;
+using qx::InErr;
+using qx::InErrAndReturnedWithHost;
+using qx::Returned;
+using qx::ValuesInPlace;
+
+ErrorCode LinFit_head(DBL1D y, DBL1D x, DBL1D w, double *slope, double *intercept, double *mse) {
+    return Returned(qx::Line<ValuesInPlace, In<DBL1D>>, y, x, w, slope, intercept, mse);
+}
+int32_t LinFitCoef_head(DBL1D y, DBL1D x, double *slope, double *intercept, ErrorCode *err) {
+    return InErr(err, qx::Line<CoefficientsOnly, std::nullptr_t>, y, x, nullptr, slope, intercept,
+                 nullptr);
+}
+int32_t LinFitCoef80_head(DBL1D y, DBL1D x, DBL1D w, double *slope, double *intercept,
+                          ErrorCode *err) {
+    return InErr(err, qx::Line<CoefficientsOnly, In<DBL1D>>, y, x, w, slope, intercept, nullptr);
+}
+
+ErrorCode PolyFit_head(DBL1D x, DBL1D y, int32_t order, int32_t algorithm, DBL1D fit,
+                       DBL1D coefficients, double *mse) {
+    return Returned(qx::FitPoly, x, y, order, algorithm, fit, coefficients, mse);
+}
+ErrorCode PolyFit80_head(DBL1D x, DBL1D y, int32_t order, int32_t algorithm, I32_1D fixedOrders,
+                         DBL1D fixedValues, DBL1D fit, DBL1D coefficients, double *mse) {
+    return Returned(qx::FitPolyWithFixed, x, y, order, algorithm, fixedOrders, fixedValues, fit,
+                    coefficients, mse);
+}
+ErrorCode PolyFit81_head(DBL1D x, DBL1D y, int32_t order, DBL1D w, int32_t algorithm,
+                         I32_1D fixedOrders, DBL1D fixedValues, DBL1D fit, DBL1D coefficients,
+                         double *mse) {
+    return Returned(qx::FitPolyWeighted, x, y, order, w, algorithm, fixedOrders, fixedValues, fit,
+                    coefficients, mse);
+}
+
+ErrorCode GenLSFit_head(DBL2D H, DBL1D y, DBL1D deviations, int32_t algorithm,
+                        int32_t wantCovariance, DBL1D coefficients, DBL1D fit, DBL2D covariance,
+                        double *mse) {
+    return Returned(qx::FitMatrix<Given::Deviations>, H, y, deviations, algorithm, wantCovariance,
+                    coefficients, fit, covariance, mse);
+}
+ErrorCode GenLSFit80_head(DBL2D H, DBL1D y, DBL1D w, int32_t algorithm, int32_t wantCovariance,
+                          DBL1D coefficients, DBL1D fit, DBL2D covariance, double *mse) {
+    return Returned(qx::FitMatrix<Given::Weights>, H, y, w, algorithm, wantCovariance, coefficients,
+                    fit, covariance, mse);
+}
+
+ErrorCode GoodnessOfFit_head(DBL1D y, DBL1D fit, DBL1D w, int32_t dof, double *sse, double *rSquare,
+                             double *rmse) {
+    return Returned(qx::ScoreFit, y, fit, w, dof, sse, rSquare, rmse);
+}
+
+ErrorCode GetNewCoef_head(DBL1D coefficients, DBL2D a, DBL1D gradient, const double *lambda,
+                          ErrorCode *err) {
+    return InErrAndReturnedWithHost(err, qx::DampedStep, coefficients, a, gradient, lambda);
+}

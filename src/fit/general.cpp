@@ -1,0 +1,203 @@
+#include "fit/general.h"
+
+#include "fit/elimination.h"
+#include "fit/residuals.h"
+#include "frame/constants.h"
+#include "frame/scratch.h"
+#include "linalg/factorisations/range.h"
+#include "linalg/factorisations/svd.h"
+#include "linalg/matrix.h"
+#include "linalg/products/ordered.h"
+#include "linalg/products/products.h"
+#include "linalg/systems/least_squares.h"
+#include "linalg/systems/lu.h"
+#include "linalg/systems/triangular.h"
+
+#include <cmath>
+#include <cstring>
+
+namespace qx {
+
+namespace {
+
+// R without the target, row after row.
+void CopyTriangle(const Elimination &triangle, int32_t k, DBL *r) {
+    for (int32_t i = 0; i < k; ++i)
+        for (int32_t j = 0; j < k; ++j)
+            r[std::ptrdiff_t{i} * k + j] = j < i ? 0.0 : triangle.row(i)[j];
+}
+
+// a b^T of two square matrices.
+ErrorCode TimesTranspose(const DBL *a, const DBL *b, int32_t k, DBL *out) {
+    Scratch<ElementType::DBL> transposed;
+    if (const ErrorCode failed = transposed.allocate(int64_t{k} * k))
+        return failed;
+    TransposeInto(b, k, k, transposed.data());
+    OrderedProduct(a, transposed.data(), k, k, k, out);
+    return 0;
+}
+
+// H has the singular values and the right vectors of R, and of U only U^T y is asked for.
+ErrorCode SolveByValues(const LinearModel &model, const Elimination &triangle, double relativeCut,
+                        DBL *c, DBL *covariance) {
+    const int32_t k = model.k;
+    const std::ptrdiff_t square = std::ptrdiff_t{k} * k;
+    Scratch<ElementType::DBL> memory;
+    if (const ErrorCode failed = memory.allocate(3 * int64_t{k} * k + k))
+        return failed;
+    DBL *const r = memory.data(), *const u = r + square, *const v = u + square,
+               *const s = v + square;
+    CopyTriangle(triangle, k, r);
+    // The decomposition takes what is far below 1 for zero.
+    const int exponent = BringIntoRange<ElementType::DBL>(r, k, k, k, 1.0);
+    if (const ErrorCode failed = SVDecompose(r, k, k, u, s, v, 0))
+        return failed;
+    for (int32_t j = 0; j < k; ++j)
+        s[j] = std::ldexp(s[j], exponent);
+
+    const double cut = relativeCut * s[0];
+    Fill(c, k, 0.0);
+    for (int32_t j = 0; j < k; ++j) {
+        const bool isUsed = s[j] > cut;
+        double along = 0.0;
+        for (int32_t i = 0; i < k; ++i)
+            along += u[std::ptrdiff_t{i} * k + j] * triangle.target(i);
+        const double share = along / s[j];
+        const double inverse = 1.0 / s[j];
+        for (int32_t i = 0; i < k; ++i) {
+            DBL &element = v[std::ptrdiff_t{i} * k + j];
+            if (isUsed)
+                c[i] += share * element;
+            element = isUsed ? element * inverse : 0.0;
+        }
+    }
+    return covariance == nullptr ? 0 : TimesTranspose(v, v, k, covariance);
+}
+
+ErrorCode SolveByTriangle(const LinearModel &model, const Elimination &triangle, DBL *c,
+                          DBL *covariance) {
+    const int32_t k = model.k;
+    for (int32_t i = 0; i < k; ++i)
+        c[i] = triangle.target(i);
+    if (const ErrorCode failed =
+            SolveUpperTriangular(triangle.row(0), triangle.stride(), c, k, nullptr))
+        return failed;
+    if (covariance == nullptr)
+        return 0;
+    Scratch<ElementType::DBL> memory;
+    if (const ErrorCode failed = memory.allocate(3 * int64_t{k} * k))
+        return failed;
+    const std::ptrdiff_t square = std::ptrdiff_t{k} * k;
+    DBL *const r = memory.data(), *const transposed = r + square, *const normal = r + 2 * square;
+    CopyTriangle(triangle, k, r);
+    TransposeInto(r, k, k, transposed);
+    OrderedProduct(transposed, r, k, k, k, normal);
+    return PseudoInverseMatrix(normal, k, k, -1.0, covariance);
+}
+
+// The sums of the normal equations: [normal | right], k by k + 1, each element one sum over the
+// samples in ascending order.
+ErrorCode SumNormalEquations(const LinearModel &model, DBL *sums) {
+    const int32_t k = model.k, cols = k + 1;
+    Fill(sums, std::ptrdiff_t{k} * cols, 0.0);
+    RowStream stream;
+    if (const ErrorCode failed = stream.open(model))
+        return failed;
+    Scratch<ElementType::DBL> rows;
+    RowBlock block;
+    while (stream.next(&block)) {
+        const int32_t count = block.count;
+        if (rows.data() == nullptr) // the first block is the largest
+            if (const ErrorCode failed = rows.allocate(int64_t{count} * cols))
+                return failed;
+        TransposeInto(block.start, cols, count, rows.data());
+        for (int32_t j = 0; model.w != nullptr && j < k; ++j)
+            for (int32_t i = 0; i < count; ++i)
+                block.column(j)[i] *= std::fabs(model.w[block.first + i]);
+        AddProduct(k, cols, count, block.start, count, rows.data(), cols, sums, cols);
+    }
+    return 0;
+}
+
+ErrorCode SolveByNormalEquations(const LinearModel &model, int32_t method, DBL *c,
+                                 DBL *covariance) {
+    const std::ptrdiff_t k = model.k;
+    Scratch<ElementType::DBL> memory;
+    if (const ErrorCode failed = memory.allocate(2 * int64_t{k} * k + 2 * int64_t{k}))
+        return failed;
+    DBL *const sums = memory.data(), *const normal = sums + k * (k + 1);
+    DBL *const right = normal + k * k;
+    if (const ErrorCode failed = SumNormalEquations(model, sums))
+        return failed;
+    for (std::ptrdiff_t i = 0; i < k; ++i) {
+        std::memcpy(normal + i * k, sums + i * (k + 1), static_cast<std::size_t>(k) * sizeof(DBL));
+        right[i] = sums[i * (k + 1) + k];
+    }
+    if (covariance != nullptr)
+        if (const ErrorCode failed =
+                PseudoInverseMatrix(normal, model.k, model.k, -1.0, covariance))
+            return failed;
+    if (method == byLU)
+        return SolveByLU(normal, model.k, right, c);
+    const ErrorCode status = CholeskySolve(normal, model.k, 0, right, 1, c);
+    return status == ErrNotPositiveDefinite ? ErrSingularMatrix : status;
+}
+
+} // namespace
+
+ErrorCode SolveLinearModel(const LinearModel &model, int32_t method, DBL *c, DBL *covariance) {
+    if (model.k < 1)
+        return ErrOrderNotPositive;
+    if (model.n < model.k)
+        return ErrPolynomialOrderTooHigh;
+    if (method < bySVD || method > byCutSVD)
+        return ErrInvalidSelector;
+    if (method == byLU || method == byCholesky)
+        return SolveByNormalEquations(model, method, c, covariance);
+    Elimination triangle;
+    if (const ErrorCode failed = triangle.reduce(model))
+        return failed;
+    if (method == bySVD || method == byCutSVD)
+        return SolveByValues(model, triangle, method == byCutSVD ? model.n * kEpsilon : 0.0, c,
+                             covariance);
+    return SolveByTriangle(model, triangle, c, covariance);
+}
+
+ErrorCode FitGeneral(const DBL *h, int32_t n, int32_t k, const DBL *y, const DBL *w, DBL *c,
+                     DBL *fit, DBL *mse, DBL *covariance, int32_t algorithm) {
+    const auto writeRows = [=](const RowBlock &block) {
+        const auto bytes = static_cast<std::size_t>(block.count) * sizeof(DBL);
+        TransposeInto(h + std::ptrdiff_t{block.first} * k, block.count, k, block.start);
+        std::memcpy(block.column(k), y + block.first, bytes);
+    };
+    if (const ErrorCode status = SolveLinearModel({writeRows, n, k, w}, algorithm, c, covariance))
+        return status;
+    if (fit == nullptr || mse == nullptr)
+        return 0;
+    SquaredResiduals squares(w);
+    for (std::ptrdiff_t i = 0; i < n; ++i) {
+        double f = 0.0;
+        for (std::ptrdiff_t j = 0; j < k; ++j)
+            f += h[i * k + j] * c[j];
+        squares.add(static_cast<int32_t>(i), y[i], f);
+        fit[i] = f;
+    }
+    *mse = squares.mean(n);
+    return 0;
+}
+
+ErrorCode SolveUpperTriangular(const DBL *r, std::ptrdiff_t stride, DBL *v, int32_t k, DBL *x) {
+    DBL *const solution = x == nullptr ? v : x;
+    for (std::ptrdiff_t i = k - 1; i >= 0; --i) {
+        const DBL *const row = r + i * stride;
+        if (row[i] == 0.0 || row[i] != row[i])
+            return ErrSingularMatrix;
+        double tail = 0.0;
+        for (std::ptrdiff_t j = i + 1; j < k; ++j)
+            tail += row[j] * solution[j];
+        solution[i] = (v[i] - tail) / row[i];
+    }
+    return 0;
+}
+
+} // namespace qx

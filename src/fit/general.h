@@ -1,0 +1,39 @@
+#ifndef QX_FIT_GENERAL_H
+#define QX_FIT_GENERAL_H
+
+#include "fit/model_rows.h"
+#include "qx/errors.h"
+
+namespace qx {
+
+// How a linear least-squares problem is solved.
+enum LeastSquaresMethod : int32_t {
+    bySVD = 0, // no singular value is left out but exact zeros
+    byQR = 1,  // kept: 1, 2 and 3 are one method
+    byQR2 = 2,
+    byQR3 = 3,
+    byLU = 4,       // on the normal equations
+    byCholesky = 5, // on the normal equations
+    byCutSVD = 6    // without singular values up to n eps times the largest one
+};
+
+// The c that minimises sum of |w| (y - H c)^2. The covariance, k by k or null, is the (pseudo-)
+// inverse of H^T |W| H.
+//
+// ErrOrderNotPositive (k < 1), ErrPolynomialOrderTooHigh (n < k), ErrInvalidSelector,
+// ErrOutOfMemory, ErrNonFiniteInput, ErrSingularMatrix (not by singular values),
+// ErrIterationLimit.
+ErrorCode SolveLinearModel(const LinearModel &model, int32_t method, DBL *c, DBL *covariance);
+
+// The same for a row-major matrix H, n by k. Where both fit and mse are given, H c and its
+// WeightedMSE as well; fit may be y.
+ErrorCode FitGeneral(const DBL *h, int32_t n, int32_t k, const DBL *y, const DBL *w, DBL *c,
+                     DBL *fit, DBL *mse, DBL *covariance, int32_t algorithm);
+
+// Solves r x = v for the upper triangle of order k of a row-major matrix; x null is in place of
+// v. ErrSingularMatrix where a diagonal element is 0 or NaN.
+ErrorCode SolveUpperTriangular(const DBL *r, std::ptrdiff_t stride, DBL *v, int32_t k, DBL *x);
+
+} // namespace qx
+
+#endif

@@ -1,0 +1,204 @@
+#include "fit/growth.h"
+
+#include "fit/general.h"
+#include "fit/residuals.h"
+#include "fit/weights.h"
+#include "frame/scratch.h"
+#include "linalg/matrix.h"
+
+#include <cmath>
+
+namespace qx {
+
+namespace {
+
+// What exponential and power have in common: y = a g(b), g = exp(b t), with t = x or t = ln x. The
+// derivatives are g and a t g.
+struct GrowthData {
+    const DBL *x, *t, *y, *w;
+    int32_t n;
+};
+double Exponential(const GrowthData &data, double b, int32_t i) { return std::exp(b * data.x[i]); }
+double Power(const GrowthData &data, double b, int32_t i) { return std::pow(data.x[i], b); }
+
+struct Parameters {
+    double a, b, mse;
+};
+
+// +1, or -1 where more values are negative than positive.
+double DataSign(const DBL *y, int32_t n) {
+    int32_t balance = 0;
+    for (int32_t i = 0; i < n; ++i)
+        balance += (y[i] > 0.0) - (y[i] < 0.0);
+    return balance < 0 ? -1.0 : 1.0;
+}
+
+// The line ln(sign y) = p + q t over the values of that sign, in rows that carry their weights
+// |w| y^2; the others are rows of zeros.
+ErrorCode FitLogarithms(const GrowthData &data, double sign, DBL *pq) {
+    int32_t count = 0;
+    for (int32_t i = 0; i < data.n; ++i)
+        count += sign * data.y[i] > 0.0;
+    if (count < 2)
+        return ErrPolynomialOrderTooHigh;
+    const auto writeRows = [&](const RowBlock &block) {
+        for (int32_t k = 0; k < block.count; ++k) {
+            const int32_t i = block.first + k;
+            const double size = sign * data.y[i];
+            const bool isUsed = size > 0.0;
+            const double root = data.w == nullptr ? size : size * std::sqrt(std::fabs(data.w[i]));
+            block.column(0)[k] = isUsed ? root : 0.0;
+            block.column(1)[k] = isUsed ? root * data.t[i] : 0.0;
+            block.column(2)[k] = isUsed ? root * std::log(size) : 0.0;
+        }
+    };
+    return SolveLinearModel({writeRows, data.n, 2, nullptr}, bySVD, pq, nullptr);
+}
+
+// Gauss-Newton iteration. `values` has g of all samples for the latest parameters.
+template <double (*G)(const GrowthData &, double, int32_t)>
+class Iteration {
+public:
+    Iteration(const GrowthData &data, DBL *values) : data_(data), values_(values) {}
+
+    double mseAt(double a, double b) {
+        SquaredResiduals squares(data_.w);
+        for (int32_t i = 0; i < data_.n; ++i) {
+            values_[i] = G(data_, b, i);
+            squares.add(i, data_.y[i], a * values_[i]);
+        }
+        return squares.mean(data_.n);
+    }
+
+    ErrorCode step(Parameters *at) {
+        const auto writeRows = [&](const RowBlock &block) {
+            for (int32_t k = 0; k < block.count; ++k) {
+                const int32_t i = block.first + k;
+                block.column(0)[k] = values_[i];
+                block.column(1)[k] = at->a * data_.t[i] * values_[i];
+                block.column(2)[k] = data_.y[i] - at->a * values_[i];
+            }
+        };
+        DBL change[2];
+        const LinearModel model = {writeRows, data_.n, 2, data_.w};
+        if (const ErrorCode failed = SolveLinearModel(model, bySVD, change, nullptr))
+            return failed;
+        at->a += change[0];
+        at->b += change[1];
+        at->mse = mseAt(at->a, at->b);
+        return 0;
+    }
+
+    // *best starts as the first parameters.
+    ErrorCode run(const FitLimits &limits, Parameters *best, int32_t *steps) {
+        best->mse = mseAt(best->a, best->b);
+        Parameters latest = *best;
+        double earlier = 2.0 * latest.mse;
+        int32_t count = 0;
+        *steps = 0;
+        while (limits.iterations >= 0 &&
+               std::fabs(earlier - latest.mse) > earlier * limits.tolerance &&
+               latest.mse > limits.floor) {
+            earlier = latest.mse;
+            if (const ErrorCode failed = step(&latest))
+                return failed;
+            *steps = ++count;
+            const bool isWorse = latest.mse > earlier && latest.mse > best->mse;
+            if (!std::isfinite(latest.mse) || (count > limits.iterations / 10 && isWorse))
+                break;
+            if (latest.mse < best->mse)
+                *best = latest;
+            if (count > limits.iterations)
+                break;
+        }
+        return 0;
+    }
+
+private:
+    const GrowthData &data_;
+    DBL *values_;
+};
+
+// `fit` may be y.
+template <double (*G)(const GrowthData &, double, int32_t)>
+void Evaluate(const GrowthData &data, const Parameters &at, DBL *fit, DBL *mse) {
+    if (fit == nullptr && mse == nullptr)
+        return;
+    SquaredResiduals squares(data.w);
+    for (int32_t i = 0; i < data.n; ++i) {
+        const double f = at.a * G(data, at.b, i);
+        squares.add(i, data.y[i], f);
+        if (fit != nullptr)
+            fit[i] = f;
+    }
+    if (mse != nullptr)
+        *mse = squares.mean(data.n);
+}
+
+// From the guess, or the line through the logarithms, or both where the guess is of no use.
+ErrorCode FindStart(const GrowthData &data, const DBL *guess, bool needsLine, Parameters *start) {
+    if (guess == nullptr || needsLine || CheckFinite(guess, 2) != 0) {
+        const double sign = DataSign(data.y, data.n);
+        DBL pq[2];
+        if (const ErrorCode failed = FitLogarithms(data, sign, pq))
+            return failed;
+        *start = {sign * std::exp(pq[0]), pq[1], 0.0};
+    }
+    // kept: also a guess that is not finite
+    if (guess != nullptr && !needsLine)
+        *start = {guess[0], guess[1], 0.0};
+    return 0;
+}
+
+} // namespace
+
+ErrorCode FitExponential(const DBL *x, const DBL *y, const DBL *w, int32_t n, DBL *fit, DBL *a,
+                         DBL *b, DBL *mse, int32_t method, const DBL *guess,
+                         const FitLimits &limits, int32_t *steps) {
+    if (const ErrorCode failed = SettleWeights(n, 2, &w))
+        return failed;
+    const GrowthData data = {x, x, y, w, n};
+    Parameters found = {};
+    if (const ErrorCode failed = FindStart(data, guess, method == 0, &found))
+        return failed;
+    if (method != 0) {
+        Scratch<ElementType::DBL> values;
+        if (const ErrorCode failed = values.allocate(n))
+            return failed;
+        Iteration<Exponential> iteration(data, values.data());
+        if (const ErrorCode failed = iteration.run(limits.settled(), &found, steps))
+            return failed;
+    }
+    *a = found.a;
+    *b = found.b;
+    Evaluate<Exponential>(data, found, fit, mse);
+    return 0;
+}
+
+ErrorCode FitPower(const DBL *x, const DBL *y, const DBL *w, int32_t n, DBL *fit, DBL *a, DBL *b,
+                   DBL *mse, const DBL *guess, const FitLimits &limits, int32_t *steps) {
+    if (const ErrorCode failed = SettleWeights(n, 2, &w))
+        return failed;
+    for (int32_t i = 0; i < n; ++i)
+        if (!(x[i] > 0.0))
+            return ErrNotStrictlyPositive;
+    Scratch<ElementType::DBL> memory;
+    if (const ErrorCode failed = memory.allocate(2 * int64_t{n}))
+        return failed;
+    DBL *const logarithms = memory.data() + n;
+    for (int32_t i = 0; i < n; ++i)
+        logarithms[i] = std::log(x[i]);
+    const GrowthData data = {x, logarithms, y, w, n};
+    Parameters found = {};
+    if (const ErrorCode failed = FindStart(data, guess, false, &found))
+        return failed;
+    Iteration<Power> iteration(data, memory.data());
+    if (const ErrorCode failed = iteration.run(limits.settled(), &found, steps))
+        return failed;
+    *a = found.a;
+    *b = found.b;
+    Evaluate<Power>(data, found, fit, mse);
+    return 0;
+}
+
+} // namespace qx
