@@ -27,6 +27,8 @@ constexpr KeptOddity keptOddities[] = {
     {"AutoCorrelation80", Oddity::SizeBeyondBlock, "the resize is not looked at"},
     {"Deconvolution", Oddity::SizeBeyondBlock, "the resize is not looked at"},
     {"ReComplexModulatorH", Oddity::OldContentStays, "where x is empty"},
+    {"ChirpZT_head", Oddity::TimeFollowsNumber, "the direct sum has n count powers"},
+    {"CxChirpZT_head", Oddity::TimeFollowsNumber, "the direct sum has n count powers"},
     {"GenLinEqsbySVD2011_head", Oddity::TimeFollowsNumber, "refinements that do not settle"},
 };
 
