@@ -7,7 +7,7 @@
 
 namespace qx {
 
-ErrorCode SolveRowScaled(DBL *a, DBL *g, int32_t n, DBL *d) {
+ErrorCode SolveRowScaled(DBL *a, DBL *g, int32_t n, I32 *pivots, DBL *d) {
     for (std::ptrdiff_t i = 0; i < n; ++i) {
         DBL *const row = a + i * n;
         double largest = 0.0;
@@ -21,7 +21,10 @@ ErrorCode SolveRowScaled(DBL *a, DBL *g, int32_t n, DBL *d) {
             row[j] = std::ldexp(row[j], -exponent);
         g[i] = std::ldexp(g[i], -exponent);
     }
-    return SolveByLU(a, n, g, d);
+    int32_t parity;
+    if (LUDecompose(a, n, n, pivots, &parity) != 0)
+        return ErrSingularMatrix;
+    return LUSolve(a, pivots, g, n, 1, d);
 }
 
 ErrorCode AddDampedStep(DBL *a, DBL *g, int32_t n, double lambda, DBL *coefficients) {
@@ -32,9 +35,12 @@ ErrorCode AddDampedStep(DBL *a, DBL *g, int32_t n, double lambda, DBL *coefficie
             return ErrNonFiniteInput;
     }
     Scratch<ElementType::DBL> step;
+    Scratch<ElementType::I32> pivots;
     if (const ErrorCode failed = step.allocate(n))
         return failed;
-    if (const ErrorCode failed = SolveRowScaled(a, g, n, step.data()))
+    if (const ErrorCode failed = pivots.allocate(n))
+        return failed;
+    if (const ErrorCode failed = SolveRowScaled(a, g, n, pivots.data(), step.data()))
         return failed;
     for (int32_t i = 0; i < n; ++i) {
         coefficients[i] += step[i];

@@ -8,10 +8,10 @@ namespace qx {
 
 // Solves a d = g for a square a of order n after each row has been divided by a power of two near
 // its largest element, so that pivots of parameters of different size can be compared. a and g
-// are spoiled.
+// are spoiled; pivots are n elements of work, and no memory is taken.
 //
-// ErrOutOfMemory, ErrSingularMatrix.
-ErrorCode SolveRowScaled(DBL *a, DBL *g, int32_t n, DBL *d);
+// ErrSingularMatrix.
+ErrorCode SolveRowScaled(DBL *a, DBL *g, int32_t n, I32 *pivots, DBL *d);
 
 // One damped step of a fit: a with its diagonal times 1 + lambda, solved for g, is added to the
 // coefficients. a and g are spoiled.

@@ -21,11 +21,18 @@ public:
         outcome.isHosts_ = hostStatus != 0;
         return outcome;
     }
+    // A failure that leaves its results: the outputs stay as they are.
+    static Outcome WithResults(ErrorCode code) {
+        Outcome outcome(code);
+        outcome.keepsResults_ = true;
+        return outcome;
+    }
 
     // Anything but plain success: `if (const Outcome bad = x.resize(n)) return bad;`
     explicit operator bool() const { return status_ != 0; }
-    // A failure of the library or a refusal of the host; a warning is none.
-    bool failed() const { return isHosts_ || status_ < 0; }
+    // A failure of the library or a refusal of the host, after which the outputs are settled; a
+    // warning is none.
+    bool failed() const { return isHosts_ || (status_ < 0 && !keepsResults_); }
     bool isHosts() const { return isHosts_; }
 
     // The host's status as the library's code.
@@ -36,6 +43,7 @@ public:
 private:
     int32_t status_;
     bool isHosts_ = false;
+    bool keepsResults_ = false;
 };
 
 // One check of a frame: the code applies where `failed` holds.

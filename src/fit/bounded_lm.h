@@ -1,0 +1,81 @@
+#ifndef QX_FIT_BOUNDED_LM_H
+#define QX_FIT_BOUNDED_LM_H
+
+#include "fit/robust_weights.h"
+#include "qx/errors.h"
+
+namespace qx {
+
+// What is fitted: n samples, and weights of which the absolute value counts, or null for none.
+struct FitSamples {
+    const DBL *x;
+    const DBL *y;
+    const DBL *w;
+    int32_t n;
+};
+
+// The model's value at x.
+typedef double (*ModelValue)(double x, const DBL *p, int32_t count, const void *user);
+// The partial derivatives at x, one per parameter.
+typedef void (*ModelGradient)(double x, const DBL *p, int32_t count, DBL *out, const void *user);
+// Over all samples, with r = y - f(x): the mean of |w| r^2, the sum a of |w| times the outer
+// products of the derivatives (count by count), the sum g of |w| r times the derivatives, and,
+// where `jacobian` is not null, the derivatives themselves, row after row.
+typedef void (*ModelNormalEquations)(const FitSamples &samples, const DBL *p, int32_t count,
+                                     double *mse, DBL *a, DBL *jacobian, DBL *g, const void *user);
+
+// Gradient and normal equations may be null: the derivatives are then central differences, and the
+// sums are formed from values and derivatives.
+struct FitModel {
+    int32_t count; // of parameters
+    ModelValue value;
+    ModelGradient gradient;
+    ModelNormalEquations normal;
+    const void *user;
+};
+
+// One bound per parameter, infinite where there is none; null for no bounds at all. A parameter
+// whose bounds are equal is fixed.
+struct FitBounds {
+    const DBL *lower;
+    const DBL *upper;
+};
+
+// The cost of a method at p, with a and g as above for the weights that the method gives; g points
+// where the cost falls. The cost is the mean of |w| r^2, of |w r|, or of r^2 times the bisquare
+// weights (fit/robust_weights.h). `work` has EvaluationWork elements; jacobian may be null.
+//
+// ErrNaNInData (a residual is NaN), ErrNonFiniteInput (a is not finite), ErrOutOfMemory,
+// ErrIterationLimit (the singular values of a do not converge).
+int64_t EvaluationWork(int32_t n, int32_t count, int32_t method);
+void EvalLeastSquares(const FitModel &model, const FitSamples &samples, const DBL *p, DBL *a,
+                      DBL *jacobian, DBL *g, double *cost, DBL *work);
+ErrorCode EvalLeastAbsolute(const FitModel &model, const FitSamples &samples, const DBL *p, DBL *a,
+                            DBL *g, double *cost, DBL *work);
+ErrorCode EvalBisquare(const FitModel &model, const FitSamples &samples, const DBL *p, DBL *a,
+                       DBL *g, double *cost, DBL *work);
+
+// Levenberg-Marquardt iteration from p within the bounds, with the damping a (1 + lambda) + lambda
+// of the diagonal (K. Levenberg, "A method for the solution of certain non-linear problems in least
+// squares", 1944; D. W. Marquardt, "An algorithm for least-squares estimation of nonlinear
+// parameters", 1963). A parameter at a bound takes no part in the normal equations: it stays as
+// long as the cost falls beyond the bound, else it moves along the gradient alone.
+//
+// It ends, with 0, where a step lowers the cost by less than the tolerance times the cost, where
+// the damping has passed 10000 without a better point, where the cost is 0, and with bisquare where
+// no parameter changes by more than the tolerance times itself. A tolerance of 0 or below is 1e-8,
+// and such a damping 1. *iterations is the limit, below 0 for none, and becomes the count of steps
+// that were tried after the first; *lambda becomes the last damping. fit, where not null, takes the
+// model at all x; *mse is the cost, with bisquare the mean of |w| r^2.
+//
+// ErrEmptyInput (no samples, or no p), ErrPolynomialOrderTooHigh (fewer samples than parameters),
+// ErrInvalidSelector (no such method), ErrBoundsCrossed, ErrOutOfMemory, ErrNaNInData (no weights
+// at the start), ErrNonFiniteInput (no finite cost at the start, nor at the next point),
+// ErrSingularMatrix (the damped equations have no solution), ErrIterationLimit, with p valid.
+ErrorCode BoundedLM(const FitModel &model, const FitSamples &samples, int32_t method,
+                    const FitBounds &bounds, DBL *p, int32_t *iterations, double tolerance,
+                    double *lambda, DBL *fit, double *mse);
+
+} // namespace qx
+
+#endif

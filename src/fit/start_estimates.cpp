@@ -1,0 +1,193 @@
+#include "fit/start_estimates.h"
+
+#include "fit/gaussian.h"
+#include "fit/general.h"
+#include "fit/growth.h"
+#include "fit/polynomial.h"
+#include "frame/constants.h"
+#include "frame/scratch.h"
+#include "stats/histogram.h"
+#include "stats/order.h"
+
+#include <algorithm>
+#include <cmath>
+
+namespace qx {
+
+namespace {
+
+typedef Scratch<ElementType::DBL> Work;
+
+ErrorCode OffsetOfParabola(const FitSamples &samples, double *offset) {
+    DBL c[3];
+    const ErrorCode status = FitPolynomial(samples.x, samples.y, samples.w, samples.n, 2, bySVD,
+                                           nullptr, nullptr, 0, nullptr, c, nullptr);
+    if (status < 0)
+        return status;
+    const bool bends = std::isfinite(c[2]) && std::fabs(c[2]) > kEpsilon;
+    *offset = bends ? c[0] - c[1] * c[1] / (4.0 * c[2]) : 0.0;
+    return 0;
+}
+
+void Lower(const DBL *y, int32_t n, double by, DBL *out) {
+    for (int32_t i = 0; i < n; ++i)
+        out[i] = y[i] - by;
+}
+
+constexpr int32_t levels = 10;
+
+struct Levels {
+    I32 counts[levels];
+    DBL centres[levels];
+    double halfWidth;
+    double max, min, atMax, atMin; // the extremes of y, and where they stand
+};
+
+ErrorCode FindLevels(const FitSamples &samples, Levels *found) {
+    DBL max, min;
+    I32 maxIndex, minIndex;
+    if (const ErrorCode failed =
+            ArrayMaxMin(samples.y, samples.n, &max, &maxIndex, &min, &minIndex))
+        return failed;
+    if (maxIndex < 0) // all are NaN
+        return ErrNoUsableFit;
+    *found = {};
+    found->halfWidth = 0.5 * ((max - min) / levels);
+    found->max = max;
+    found->min = min;
+    found->atMax = samples.x[maxIndex];
+    found->atMin = samples.x[minIndex];
+    return ArrayHistogram(samples.y, samples.n, min, max, found->counts, found->centres, levels);
+}
+
+// The outermost level, from below or from above, at which more than a tenth of the samples stay.
+int32_t BaseLevel(const Levels &found, int32_t n, bool fromBelow) {
+    for (int32_t i = 0; i < levels; ++i) {
+        const int32_t level = fromBelow ? i : levels - 1 - i;
+        if (found.counts[level] > n / levels)
+            return level;
+    }
+    return fromBelow ? 0 : levels - 1;
+}
+
+// Half the longer distance from the extreme to where the data are back at their level.
+double Deviation(const FitSamples &samples, double extremeAt, double level, double halfWidth) {
+    double left = std::fabs(samples.x[0] - extremeAt);
+    double right = std::fabs(samples.x[samples.n - 1] - extremeAt);
+    for (int32_t i = 0; i < samples.n; ++i) {
+        if (!(samples.y[i] > level - halfWidth && samples.y[i] < level + halfWidth))
+            continue;
+        const double distance = std::fabs(samples.x[i] - extremeAt);
+        if (samples.x[i] < extremeAt)
+            left = distance < left ? distance : left;
+        else if (samples.x[i] > extremeAt)
+            right = distance < right ? distance : right;
+    }
+    return (left > right ? left : right) / 2.0;
+}
+
+// A peak or a dip, fitted above or below its level; mse is below 0 where it does not fit.
+struct Candidate {
+    DBL p[4];
+    DBL mse = -1.0;
+
+    ErrorCode fit(const FitSamples &samples, const Levels &found, bool isPeak, DBL *y) {
+        const double level = found.centres[BaseLevel(found, samples.n, isPeak)];
+        const double extremeAt = isPeak ? found.atMax : found.atMin;
+        const DBL guess[3] = {(isPeak ? found.max : found.min) - level, extremeAt,
+                              Deviation(samples, extremeAt, level, found.halfWidth)};
+        Lower(samples.y, samples.n, level, y);
+        int32_t steps;
+        const FitLimits limits = {0.0001, 0.0001, 20};
+        const ErrorCode status = FitGaussian(samples.x, y, samples.w, samples.n, nullptr, &p[0],
+                                             &p[1], &p[2], &mse, guess, limits, &steps);
+        p[3] = level;
+        if (status == ErrOutOfMemory)
+            return status;
+        // The sum of a mean square may come out just below 0.
+        mse = status < 0 || !std::isfinite(mse) ? -1.0 : std::max(0.0, +mse);
+        return 0;
+    }
+};
+
+// The samples without those of weight 0.
+class Counting {
+public:
+    ErrorCode take(const FitSamples &samples) {
+        samples_ = samples;
+        if (samples.w == nullptr)
+            return 0;
+        const int64_t n = samples.n;
+        if (const ErrorCode failed = memory_.allocate(3 * n))
+            return failed;
+        DBL *const x = memory_.data(), *const y = x + n, *const w = y + n;
+        int32_t count = 0;
+        for (int32_t i = 0; i < samples.n; ++i) {
+            if (samples.w[i] == 0.0)
+                continue;
+            x[count] = samples.x[i];
+            y[count] = samples.y[i];
+            w[count++] = samples.w[i];
+        }
+        samples_ = {x, y, w, count};
+        return 0;
+    }
+    const FitSamples &samples() const { return samples_; }
+
+private:
+    FitSamples samples_ = {};
+    Work memory_;
+};
+
+} // namespace
+
+ErrorCode StartExponential(const FitSamples &samples, DBL *p) {
+    Work above;
+    if (const ErrorCode failed = above.allocate(samples.n))
+        return failed;
+    double offset;
+    if (const ErrorCode failed = OffsetOfParabola(samples, &offset))
+        return failed;
+    Lower(samples.y, samples.n, offset, above.data());
+    int32_t steps;
+    const ErrorCode status =
+        FitExponential(samples.x, above.data(), samples.w, samples.n, nullptr, &p[0], &p[1],
+                       nullptr, 0, nullptr, {0.0001, 1e-12, 50}, &steps);
+    p[2] = offset;
+    return status < 0 ? status : 0;
+}
+
+ErrorCode StartPower(const FitSamples &samples, DBL *p) {
+    Work logarithms;
+    if (const ErrorCode failed = logarithms.allocate(samples.n))
+        return failed;
+    for (int32_t i = 0; i < samples.n; ++i)
+        logarithms[i] = std::log(samples.x[i]);
+    return StartExponential({logarithms.data(), samples.y, samples.w, samples.n}, p);
+}
+
+ErrorCode StartGaussian(const FitSamples &samples, DBL *p) {
+    Counting counting;
+    if (const ErrorCode failed = counting.take(samples))
+        return failed;
+    const FitSamples &used = counting.samples();
+    Work above;
+    if (const ErrorCode failed = above.allocate(used.n))
+        return failed;
+    Levels found;
+    if (const ErrorCode failed = FindLevels(used, &found))
+        return failed;
+    Candidate peak, dip;
+    if (const ErrorCode failed = peak.fit(used, found, true, above.data()))
+        return failed;
+    if (const ErrorCode failed = dip.fit(used, found, false, above.data()))
+        return failed;
+    if (peak.mse < 0.0 && dip.mse < 0.0)
+        return ErrNoUsableFit;
+    const bool takesPeak = dip.mse < 0.0 || (peak.mse >= 0.0 && peak.mse <= dip.mse);
+    for (int32_t i = 0; i < 4; ++i)
+        p[i] = takesPeak ? peak.p[i] : dip.p[i];
+    return 0;
+}
+
+} // namespace qx

@@ -1,0 +1,706 @@
+#include "fit/bounded_fits.h"
+#include "fit/models.h"
+#include "fit/tests/nist_models.h"
+#include "qx/bounded_fits.h"
+#include "tests/support/heap_probe.h"
+#include "tests/support/hostile_host.h"
+#include "tests/support/recipe.h"
+#include "tests/support/test_data.h"
+
+#include <gtest/gtest.h>
+
+#include <cstdlib>
+#include <functional>
+#include <limits>
+
+namespace {
+
+using qx::test::DBLArray;
+using qx::test::HeapProbe;
+using qx::test::Noise;
+typedef std::vector<double> Values;
+
+constexpr double inf = std::numeric_limits<double>::infinity();
+const double nan = std::numeric_limits<double>::quiet_NaN();
+constexpr uint16_t methods[] = {qx::leastSquares, qx::leastAbsolute, qx::bisquare};
+
+// The models as they are defined.
+typedef std::function<double(double x, const Values &p)> Model;
+const Model line = [](double x, const Values &p) { return p[0] * x + p[1]; };
+const Model exponential = [](double x, const Values &p) { return p[0] * exp(p[1] * x) + p[2]; };
+const Model power = [](double x, const Values &p) { return p[0] * pow(x, p[1]) + p[2]; };
+const Model logarithm = [](double x, const Values &p) { return p[0] * log(p[1] * x); };
+const Model gaussian = [](double x, const Values &p) {
+    return p[0] * exp(-pow((x - p[1]) / p[2], 2) / 2) + p[3];
+};
+constexpr double natural = 2.71828;
+
+// One call of an export.
+struct Fit {
+    Values x, y, w = {}, guess = {}, lower = {}, upper = {};
+    uint16_t method = 0;
+    double tolerance = 1e-14, base = natural;
+    int32_t iterations = 1000;
+
+    ErrorCode status = 1;
+    Values p = {}, fit = {};
+    double mse = -1;
+
+    const Fit &operator()(const char *model) {
+        const DBLArray ys(y), xs(x), ws(w), start(guess), low(lower), high(upper);
+        const std::string name = model;
+        double out[5] = {-1, -1, -1, -1, -1};
+        std::size_t count = 2;
+        DBL1D const handle = ys.handle();
+        if (name == "line" && method == 0)
+            status = BoundLinearFit_head(handle, xs.handle(), ws.handle(), low.handle(),
+                                         high.handle(), &out[0], &out[1], &out[2]);
+        else if (name == "line")
+            status = (method == 1 ? BoundLinearFitLAR_head : BoundLinearFitBi_head)(
+                handle, xs.handle(), ws.handle(), tolerance, &iterations, low.handle(),
+                high.handle(), &out[0], &out[1], &out[2]);
+        else if (name == "logarithm")
+            status = BoundLogFit_head(handle, xs.handle(), ws.handle(), base, &iterations,
+                                      start.handle(), low.handle(), high.handle(), method,
+                                      tolerance, &out[0], &out[1], &out[2]);
+        else if (name == "gaussian")
+            status = BoundGaussianFit_head(handle, xs.handle(), ws.handle(), tolerance, &iterations,
+                                           start.handle(), low.handle(), high.handle(), method,
+                                           &out[0], &out[1], &out[2], &out[3], &out[4]),
+            count = 4;
+        else
+            status = (name == "power" ? BoundPowerFit_head : BoundExpFit_head)(
+                handle, xs.handle(), ws.handle(), tolerance, &iterations, start.handle(),
+                low.handle(), high.handle(), method, &out[0], &out[1], &out[2], &out[3]),
+            count = 3;
+        p.assign(out, out + count);
+        mse = out[count];
+        fit = ys.values();
+        return *this;
+    }
+};
+
+double Cost(const Fit &f, const Model &model, uint16_t method = qx::leastSquares) {
+    long double sum = 0;
+    for (std::size_t i = 0; i < f.x.size(); ++i) {
+        const long double r = f.y[i] - model(f.x[i], f.p);
+        sum += (f.w.empty() ? 1.0L : f.w[i]) * (method == qx::leastAbsolute ? std::fabs(r) : r * r);
+    }
+    return static_cast<double>(sum / f.x.size());
+}
+
+Fit Sampled(const Model &model, const Values &p, double x0, double x1, int n, double sigma,
+            uint64_t seed) {
+    Noise noise(seed);
+    Fit f;
+    for (int i = 0; i < n; ++i) {
+        f.x.push_back(x0 + (x1 - x0) * i / (n - 1));
+        f.y.push_back(model(f.x.back(), p) + sigma * noise.symmetric());
+    }
+    return f;
+}
+
+// The core.
+
+struct CoreModel {
+    const char *name;
+    qx::FitModel model;
+    std::vector<DBL> p;
+};
+
+std::vector<CoreModel> CoreModels() {
+    return {{"exponential", qx::FitModelOf<qx::ExponentialModel>(), {2.5, -0.7, 0.3}},
+            {"power", qx::FitModelOf<qx::PowerModel>(), {1.5, -1.2, 0.7}},
+            {"gaussian", qx::FitModelOf<qx::GaussianModel>(), {3.0, 1.8, 0.9, -0.4}}};
+}
+
+struct Sums {
+    double cost;
+    std::vector<DBL> a, g, jacobian;
+};
+
+Sums SumsAt(const qx::FitModel &model, const qx::FitSamples &samples, const std::vector<DBL> &p,
+            int32_t method) {
+    const auto count = static_cast<std::size_t>(model.count);
+    const auto n = static_cast<std::size_t>(samples.n);
+    Sums sums = {0, std::vector<DBL>(count * count), std::vector<DBL>(count),
+                 std::vector<DBL>(n * count)};
+    std::vector<DBL> work(
+        static_cast<std::size_t>(qx::EvaluationWork(samples.n, model.count, method)));
+    if (method == qx::leastSquares)
+        qx::EvalLeastSquares(model, samples, p.data(), sums.a.data(), sums.jacobian.data(),
+                             sums.g.data(), &sums.cost, work.data());
+    else
+        EXPECT_EQ(
+            (method == qx::bisquare ? qx::EvalBisquare : qx::EvalLeastAbsolute)(
+                model, samples, p.data(), sums.a.data(), sums.g.data(), &sums.cost, work.data()),
+            0);
+    return sums;
+}
+
+class BoundedFitSums : public testing::Test {
+protected:
+    BoundedFitSums() {
+        Noise noise(5);
+        for (int i = 0; i < n; ++i) {
+            x[i] = 0.5 + 0.17 * i;
+            y[i] = 2.0 / x[i] + 0.4 * noise.symmetric();
+            w[i] = noise.symmetric(); // of either sign
+        }
+    }
+    static constexpr int n = 23;
+    DBL x[n], y[n], w[n];
+};
+
+// All three ways to the same sums: closed forms, given derivatives, differences.
+TEST_F(BoundedFitSums, DoNotDependOnTheWayToTheDerivatives) {
+    for (const DBL *const weights :
+         {static_cast<const DBL *>(nullptr), static_cast<const DBL *>(w)})
+        for (CoreModel core : CoreModels()) {
+            SCOPED_TRACE(core.name);
+            const qx::FitSamples samples = {x, y, weights, n};
+            const Sums closed = SumsAt(core.model, samples, core.p, qx::leastSquares);
+            core.model.normal = nullptr;
+            const Sums general = SumsAt(core.model, samples, core.p, qx::leastSquares);
+            core.model.gradient = nullptr;
+            const Sums numeric = SumsAt(core.model, samples, core.p, qx::leastSquares);
+            EXPECT_DOUBLE_EQ(closed.cost, general.cost);
+            for (std::size_t i = 0; i < closed.a.size(); ++i) {
+                EXPECT_NEAR(closed.a[i], general.a[i], 1e-13 * std::fabs(general.a[i]));
+                EXPECT_NEAR(closed.a[i], numeric.a[i], 1e-8 * std::fabs(closed.a[0]));
+            }
+            for (std::size_t i = 0; i < closed.g.size(); ++i) {
+                EXPECT_NEAR(closed.g[i], general.g[i], 1e-12);
+                EXPECT_NEAR(closed.g[i], numeric.g[i], 1e-7);
+            }
+            for (std::size_t i = 0; i < closed.jacobian.size(); ++i)
+                EXPECT_NEAR(closed.jacobian[i], numeric.jacobian[i], 1e-7);
+        }
+}
+
+// g is what the cost falls by: n times its derivative is -2 g, or -g for absolute residuals.
+TEST_F(BoundedFitSums, PointDownhill) {
+    for (const int32_t method : {qx::leastSquares, qx::leastAbsolute})
+        for (const CoreModel &core : CoreModels()) {
+            SCOPED_TRACE(core.name + std::to_string(method));
+            const qx::FitSamples samples = {x, y, w, n};
+            const Sums sums = SumsAt(core.model, samples, core.p, method);
+            for (std::size_t i = 0; i < core.p.size(); ++i) {
+                std::vector<DBL> above = core.p, below = core.p;
+                constexpr double h = 1e-6;
+                above[i] += h;
+                below[i] -= h;
+                const double slope = (SumsAt(core.model, samples, above, method).cost -
+                                      SumsAt(core.model, samples, below, method).cost) /
+                                     (2 * h);
+                const double factor = method == qx::leastSquares ? 2 : 1;
+                EXPECT_NEAR(n * slope, -factor * sums.g[i], 2e-6 * (1 + std::fabs(sums.g[i])));
+            }
+        }
+}
+
+TEST_F(BoundedFitSums, BisquareLeavesOutWhatLiesFarOff) {
+    const CoreModel core = CoreModels()[0];
+    const qx::FitSamples samples = {x, y, nullptr, n};
+    y[7] = 50.0;
+    const Sums near = SumsAt(core.model, samples, core.p, qx::bisquare);
+    y[7] = 5000.0;
+    const Sums far = SumsAt(core.model, samples, core.p, qx::bisquare);
+    EXPECT_EQ(near.cost, far.cost);
+    for (std::size_t i = 0; i < near.a.size(); ++i)
+        EXPECT_EQ(near.a[i], far.a[i]);
+    // Residuals without spread leave the weights of the caller.
+    for (int i = 0; i < n; ++i)
+        y[i] = core.model.value(x[i], core.p.data(), 3, nullptr);
+    const qx::FitSamples exact = {x, y, w, n};
+    EXPECT_EQ(SumsAt(core.model, exact, core.p, qx::bisquare).a,
+              SumsAt(core.model, exact, core.p, qx::leastSquares).a);
+}
+
+TEST(BoundedLM, ChecksItsArguments) {
+    const qx::FitModel model = qx::FitModelOf<qx::ExponentialModel>();
+    const DBL x[] = {0, 1, 2}, y[] = {1, 2, 4}, low[] = {0, 0, 0}, high[] = {1, -1, 1};
+    DBL p[] = {1, 1, 1};
+    const auto run = [&](int32_t n, int32_t method, const qx::FitBounds &bounds, DBL *start) {
+        int32_t iterations = 10;
+        double lambda = 0, mse;
+        return qx::BoundedLM(model, {x, y, nullptr, n}, method, bounds, start, &iterations, 0,
+                             &lambda, nullptr, &mse);
+    };
+    EXPECT_EQ(run(0, 9, {low, high}, nullptr), ErrEmptyInput);
+    EXPECT_EQ(run(2, 9, {low, high}, nullptr), ErrPolynomialOrderTooHigh);
+    EXPECT_EQ(run(3, 3, {low, high}, nullptr), ErrInvalidSelector);
+    EXPECT_EQ(run(3, 0, {low, high}, nullptr), ErrEmptyInput);
+    EXPECT_EQ(run(3, 0, {low, high}, p), ErrBoundsCrossed);
+    const DBL infinite[] = {inf, inf, inf};
+    EXPECT_EQ(run(3, 0, {infinite, nullptr}, p), ErrNonFiniteInput) << "no finite cost";
+}
+
+// Steps are worked off in memory that is taken once, and the limit ends them with the best point.
+TEST(BoundedLM, CountsItsStepsAndTakesMemoryOnce) {
+    Fit f = Sampled(exponential, {2, -1, 0.5}, 0, 4, 30, 0.1, 3);
+    const qx::FitModel model = qx::FitModelOf<qx::ExponentialModel>();
+    const qx::FitSamples samples = {f.x.data(), f.y.data(), nullptr, 30};
+    Values costs;
+    for (const int32_t limit : {0, 1, 3, 200}) {
+        DBL p[] = {1, -0.1, 0};
+        int32_t iterations = limit;
+        double lambda = 0.1, mse;
+        const HeapProbe probe;
+        const ErrorCode status = qx::BoundedLM(model, samples, 0, {nullptr, nullptr}, p,
+                                               &iterations, 1e-15, &lambda, nullptr, &mse);
+        EXPECT_EQ(probe.allocations(), HeapProbe::works() ? 2 : 0);
+        EXPECT_EQ(status, limit < 200 ? ErrIterationLimit : 0);
+        EXPECT_EQ(iterations, limit < 200 ? limit : iterations);
+        EXPECT_LT(iterations, 60);
+        costs.push_back(mse);
+    }
+    for (std::size_t i = 1; i < costs.size(); ++i)
+        EXPECT_LT(costs[i], costs[i - 1]);
+    // An exact fit ends although nothing falls any more.
+    const DBL x[] = {0, 1, 2, 3}, y[] = {2, 2, 2, 2};
+    DBL p[] = {0, 0, 2};
+    int32_t iterations = -1;
+    double lambda = 0, mse;
+    EXPECT_EQ(qx::BoundedLM(model, {x, y, nullptr, 4}, 0, {nullptr, nullptr}, p, &iterations, 0,
+                            &lambda, nullptr, &mse),
+              0);
+    EXPECT_EQ(mse, 0.0);
+}
+
+// Every set of the statistical reference data from both starts, by differences alone. The starts
+// that lead elsewhere are far from the answer on purpose.
+TEST(BoundedLM, FindsTheCertifiedValues) {
+    const std::vector<std::string> elsewhere = {"BoxBOD 1", "MGH10 1", "MGH17 1"};
+    const auto sets = qx::test::ReadNistSets(qx::test::TestData("nist_nonlinear.dat"));
+    ASSERT_EQ(sets.size(), 27U);
+    std::vector<std::string> missed;
+    for (const auto &set : sets) {
+        const qx::test::NistProblem problem(set);
+        for (int start = 0; start < 2; ++start) {
+            const std::string name = set.name + " " + std::to_string(start + 1);
+            SCOPED_TRACE(name);
+            const auto [digits, squares] = problem.solve(start);
+            if (digits < 1) {
+                missed.push_back(name);
+                continue;
+            }
+            EXPECT_GE(digits, 6.3);
+            // Those of Lanczos1 are rounding errors.
+            const double part = set.name == "Lanczos1" ? 0.01 : 6e-10;
+            EXPECT_NEAR(squares, set.squares, part * set.squares);
+        }
+    }
+    EXPECT_EQ(missed, elsewhere);
+}
+
+// The exports against other code and definitions.
+
+struct Problem {
+    std::string model;
+    uint64_t seed;
+    Fit fit;
+    Values truth, optimum;
+    double sigma, cost;
+};
+
+double Number(std::istream &in) {
+    std::string word;
+    in >> word;
+    return word == "inf" ? inf : word == "-inf" ? -inf : std::atof(word.c_str());
+}
+
+const std::map<std::string, std::pair<Model, std::array<double, 2>>> models = {
+    {"exponential", {exponential, {0, 4}}},
+    {"power", {power, {0.5, 6}}},
+    {"gaussian", {gaussian, {-4, 4}}},
+    {"logarithm", {logarithm, {0.5, 8}}},
+    {"line", {line, {-3, 5}}},
+};
+
+bool Read(std::istream &in, Problem &problem) {
+    int n, weighted;
+    if (!(in >> problem.model >> n >> problem.seed >> weighted))
+        return false;
+    const std::size_t count = problem.model == "gaussian"                               ? 4
+                              : problem.model == "line" || problem.model == "logarithm" ? 2
+                                                                                        : 3;
+    const auto numbers = [&] {
+        Values values;
+        for (std::size_t i = 0; i < count; ++i)
+            values.push_back(Number(in));
+        return values;
+    };
+    problem.truth = numbers();
+    problem.sigma = Number(in);
+    problem.fit = Fit();
+    problem.fit.guess = numbers();
+    problem.fit.lower = numbers();
+    problem.fit.upper = numbers();
+    problem.cost = Number(in);
+    problem.optimum = numbers();
+    const auto &[model, range] = models.at(problem.model);
+    const double step = (range[1] - range[0]) / n;
+    Noise noise(problem.seed);
+    for (int i = 0; i < n; ++i) {
+        const double u = i == 0 ? 0 : noise.symmetric();
+        problem.fit.x.push_back(range[0] + (i + 0.5 * u) * step);
+        problem.fit.y.push_back(model(problem.fit.x.back(), problem.truth) +
+                                problem.sigma * noise.symmetric());
+        const double weight = 1 + 0.5 * noise.symmetric();
+        if (weighted != 0)
+            problem.fit.w.push_back(weight);
+    }
+    return true;
+}
+
+// A thousand random boxes around, beside and through the parameters; SciPy's least_squares from
+// the same start.
+TEST(BoundedFits, FindTheOptimumThatSciPyFinds) {
+    std::istringstream in = qx::test::Uncommented(qx::test::TestData("bounded_fits.dat"));
+    int problems = 0;
+    for (Problem problem; Read(in, problem); ++problems) {
+        SCOPED_TRACE(problem.model + " " + std::to_string(problem.seed));
+        Fit &f = problem.fit;
+        f(problem.model.c_str());
+        ASSERT_EQ(f.status, 0);
+        const Model &model = models.at(problem.model).first;
+        const double cost = Cost(f, model);
+        EXPECT_LE(cost, problem.cost * (1 + 1e-6));
+        EXPECT_NEAR(f.mse, cost, 1e-9 * cost);
+        const bool isOther = cost < problem.cost * (1 - 1e-6); // and a better minimum
+        for (std::size_t i = 0; i < f.p.size(); ++i) {
+            EXPECT_GE(f.p[i], f.lower[i]);
+            EXPECT_LE(f.p[i], f.upper[i]);
+            EXPECT_NEAR(f.p[i], problem.optimum[i], isOther ? inf : 1e-3 * (1 + std::fabs(f.p[i])));
+        }
+        for (std::size_t i = 0; i < f.x.size(); ++i)
+            EXPECT_NEAR(f.fit[i], model(f.x[i], f.p), 1e-13 * (1 + std::fabs(f.fit[i])));
+    }
+    EXPECT_EQ(problems, 1000);
+}
+
+// Without a guess, clean data give back what they were made of.
+TEST(BoundedFits, StartByThemselves) {
+    const struct {
+        const char *model;
+        Values p;
+    } cases[] = {
+        {"exponential", {2, -0.8, 1}},    {"exponential", {-3, -1.5, 4}},
+        {"exponential", {0.5, 0.7, -2}},  {"power", {2, 1.5, 1}},
+        {"power", {-3, -0.8, 5}},         {"power", {4, 0.4, -1}},
+        {"gaussian", {3, 0.5, 0.6, 1}},   {"gaussian", {-2, -1, 0.9, 4}},
+        {"gaussian", {8, 2.5, 0.4, -20}}, {"logarithm", {-2.5, 0.3}},
+    };
+    for (const auto &[name, p] : cases)
+        for (const double sigma : {0.0, 0.05}) {
+            SCOPED_TRACE(name + std::to_string(sigma));
+            const auto &[model, range] = models.at(name);
+            Fit f = Sampled(model, p, range[0], range[1], 60, sigma, 11);
+            f.w.assign(60, 1.0);
+            f.y[17] = 1e3; // does not count
+            f.w[17] = 0.0;
+            f(name);
+            ASSERT_EQ(f.status, 0);
+            for (std::size_t i = 0; i < p.size(); ++i)
+                EXPECT_NEAR(f.p[i], p[i], sigma == 0 ? 1e-4 : 0.25);
+        }
+}
+
+// Outliers.
+
+// The calls of the Belgian telephone network 1950 to 1973, in tens of millions, of which six years
+// counted minutes: P. J. Rousseeuw and A. M. Leroy, "Robust Regression and Outlier Detection",
+// 1987.
+Fit Telephones() {
+    Fit f;
+    f.y = {0.44, 0.47, 0.47, 0.59, 0.66, 0.73, 0.81, 0.88, 1.06, 1.20, 1.35, 1.49,
+           1.61, 2.12, 11.9, 12.4, 14.2, 15.9, 18.2, 21.2, 4.30, 2.40, 2.70, 2.90};
+    for (int year = 50; year < 74; ++year)
+        f.x.push_back(year);
+    return f;
+}
+
+// The least absolute residuals of any line; the best goes through two of the samples.
+double LeastAbsolute(const Fit &f) {
+    double least = inf;
+    for (std::size_t i = 0; i < f.x.size(); ++i)
+        for (std::size_t j = 0; j < i; ++j) {
+            Fit through = f;
+            const double slope = (f.y[i] - f.y[j]) / (f.x[i] - f.x[j]);
+            through.p = {slope, f.y[i] - slope * f.x[i]};
+            least = std::min(least, Cost(through, line, qx::leastAbsolute));
+        }
+    return least;
+}
+
+TEST(BoundedFits, DrawRobustLinesThroughTheTelephones) {
+    Fit f = Telephones();
+    f("line");
+    EXPECT_NEAR(f.p[0], 0.504, 5e-4) << "as published";
+    EXPECT_NEAR(f.p[1], -26.01, 5e-3);
+    f.method = qx::leastAbsolute;
+    f.tolerance = 1e-6;
+    f("line");
+    EXPECT_EQ(f.status, 0);
+    EXPECT_LT(f.mse, 1.0001 * LeastAbsolute(f));
+    EXPECT_NEAR(f.mse, Cost(f, line, qx::leastAbsolute), 1e-12);
+    f.method = qx::bisquare;
+    f.iterations = 1000;
+    f("line");
+    EXPECT_EQ(f.status, 0);
+    EXPECT_NEAR(f.p[0], 0.11, 0.005) << "the slope of the years that counted calls";
+    EXPECT_NEAR(f.mse, Cost(f, line), 1e-9);
+    // Within bounds that cut the answer off, with the best intercept that is left.
+    f.lower = {0.15, -inf};
+    f.upper = {inf, inf};
+    f.iterations = 1000;
+    f("line");
+    EXPECT_EQ(f.p[0], 0.15);
+    EXPECT_NEAR(f.p[1], -7.4, 0.3);
+}
+
+TEST(BoundedFits, LeastAbsoluteLinesComeNearTheLeast) {
+    for (uint64_t seed = 1; seed <= 20; ++seed) {
+        Fit f = Sampled(line, {1.5, -0.7}, 0, 3, 25, 0.5, seed);
+        Noise noise(seed + 100);
+        for (int i = 0; i < 5; ++i)
+            f.y[noise.bits() % 25] += 20 * noise.symmetric();
+        f.method = qx::leastAbsolute;
+        f("line");
+        EXPECT_EQ(f.status, 0) << seed;
+        EXPECT_LT(f.mse, 1.01 * LeastAbsolute(f)) << seed;
+    }
+}
+
+TEST(BoundedFits, RobustMethodsDoNotFollowOutliers) {
+    const std::map<std::string, Values> truths = {{"exponential", {3, -0.8, 1}},
+                                                  {"power", {2, 1.3, 1}},
+                                                  {"gaussian", {4, 0.5, 0.8, 1}},
+                                                  {"logarithm", {2.5, 1.5}},
+                                                  {"line", {0.7, 2}}};
+    for (const auto &[name, p] : truths) {
+        const auto &[model, range] = models.at(name);
+        double errors[3] = {};
+        for (const uint16_t method : methods) {
+            Fit f = Sampled(model, p, range[0], range[1], 80, 0.1, 21);
+            for (std::size_t i = 3; i < 80; i += 9)
+                f.y[i] += i > 40 ? 3.0 : -2.5;
+            f.method = method;
+            f.tolerance = 1e-9;
+            f(name.c_str());
+            ASSERT_EQ(f.status, 0) << name;
+            for (std::size_t i = 0; i < p.size(); ++i)
+                errors[method] = std::max(errors[method], std::fabs(f.p[i] - p[i]));
+            EXPECT_NEAR(f.mse, Cost(f, model, method), 1e-9 * f.mse) << name;
+        }
+        EXPECT_LT(errors[qx::leastAbsolute], 0.08) << name;
+        EXPECT_LT(errors[qx::bisquare], 0.08) << name;
+        EXPECT_GT(errors[qx::leastSquares], 2 * errors[qx::bisquare]) << name;
+    }
+}
+
+// Frames.
+
+TEST(BoundedFits, CheckTheirArguments) {
+    const Fit good = Sampled(exponential, {2, -0.8, 1}, 0.5, 4, 20, 0.05, 1);
+    const struct {
+        const char *what;
+        void (*spoil)(Fit &);
+        ErrorCode line, robust, exponential, power, logarithm, gaussian;
+    } cases[] = {
+        {"short x", [](Fit &f) { f.x.pop_back(); }, ErrSizeMismatch, ErrSizeMismatch,
+         ErrSizeMismatch, ErrSizeMismatch, ErrSizeMismatch, ErrSizeMismatch},
+        {"short w",
+         [](Fit &f) {
+             f.w = {1, 2};
+         },
+         ErrSizeMismatch, ErrSizeMismatch, ErrSizeMismatch, ErrSizeMismatch, ErrSizeMismatch,
+         ErrSizeMismatch},
+        {"short guess", [](Fit &f) { f.guess = {1}; }, 0, 0, WarnFitIncomplete, WarnFitIncomplete,
+         WarnFitIncomplete, WarnFitIncomplete},
+        {"long guess",
+         [](Fit &f) {
+             f.guess = {2, -0.8, 1, 1, 1};
+         },
+         0, 0, 0, 0, 0, 0},
+        {"short bounds", [](Fit &f) { f.lower = f.upper = {1}; }, ErrSizesDisagree,
+         WarnFitIncomplete, ErrSizesDisagree, ErrSizesDisagree, ErrSizesDisagree, 0},
+        {"one bound only",
+         [](Fit &f) {
+             f.lower = {-9, -9, -9, -9};
+         },
+         ErrSizesDisagree, WarnFitIncomplete, ErrSizesDisagree, ErrSizesDisagree, ErrSizesDisagree,
+         0},
+        {"NaN bound",
+         [](Fit &f) {
+             f.lower = {nan, 0, 0, 0}, f.upper = {inf, 1, 1, 1};
+         },
+         ErrNaNInData, ErrNaNInData, ErrNaNInData, ErrNaNInData, ErrNaNInData, ErrNaNInData},
+        {"crossed bounds",
+         [](Fit &f) {
+             f.lower = {-inf, -1, -inf, 1}, f.upper = {inf, -2, inf, 0};
+         },
+         ErrBoundsCrossed, ErrBoundsCrossed, ErrBoundsCrossed, ErrBoundsCrossed, ErrBoundsCrossed,
+         ErrBoundsCrossed},
+        {"one sample", [](Fit &f) { f.x = {1}, f.y = {1}; }, ErrFitPointsTooFew, ErrFitPointsTooFew,
+         ErrFitPointsTooFew, ErrFitPointsTooFew, ErrFitPointsTooFew, ErrFitPointsTooFew},
+        {"NaN weight", [](Fit &f) { f.w.assign(20, 1), f.w[3] = nan; }, ErrNonFiniteInput,
+         ErrNonFiniteInput, ErrNonFiniteInput, ErrNonFiniteInput, ErrNonFiniteInput,
+         ErrNonFiniteInput},
+        {"one weight", [](Fit &f) { f.w.assign(20, 0), f.w[3] = 1; }, ErrTooFewWeights,
+         ErrTooFewWeights, ErrTooFewWeights, ErrTooFewWeights, ErrTooFewWeights, ErrTooFewWeights},
+        {"no weights", [](Fit &f) { f.w.assign(20, 0); }, 0, 0, 0, 0, 0, 0},
+        {"x of 0", [](Fit &f) { f.x[0] = 0; }, 0, 0, 0, ErrNotStrictlyPositive, ErrMixedSigns, 0},
+        {"NaN sample",
+         [](Fit &f) {
+             f.y[5] = nan, f.guess = {1, 1, 1, 1};
+         },
+         0, ErrNaNInData, ErrNonFiniteInput, ErrNonFiniteInput, ErrNonFiniteInput,
+         ErrNonFiniteInput},
+        {"method", [](Fit &f) { f.method = 3; }, 1, 1, ErrInvalidSelector, ErrInvalidSelector,
+         ErrInvalidSelector, ErrInvalidSelector},
+        {"base", [](Fit &f) { f.base = 0; }, 0, 0, 0, 0, ErrNotStrictlyPositive, 0},
+        {"flat guess",
+         [](Fit &f) {
+             f.guess = {1, 1, 0, 0};
+         },
+         0, 0, 0, 0, 0, ErrFitStartValues},
+        {"guess not finite",
+         [](Fit &f) {
+             f.guess = {nan, 1, 0, 0};
+         },
+         0, 0, ErrNonFiniteInput, ErrNonFiniteInput, 0, 0},
+    };
+    for (const auto &test : cases)
+        for (const auto &[name, expected] :
+             std::map<std::string, ErrorCode>{{"line", test.line},
+                                              {"robust", test.robust},
+                                              {"exponential", test.exponential},
+                                              {"power", test.power},
+                                              {"logarithm", test.logarithm},
+                                              {"gaussian", test.gaussian}}) {
+            if (expected == 1)
+                continue;
+            SCOPED_TRACE(name + std::string(", ") + test.what);
+            Fit f = good;
+            f.method = name == "robust" ? qx::leastAbsolute : qx::leastSquares;
+            test.spoil(f);
+            f(name == "robust" ? "line" : name.c_str());
+            EXPECT_EQ(f.status, expected);
+            EXPECT_EQ(f.fit.empty(), expected < 0);
+            EXPECT_EQ(std::isnan(f.p[0]) && std::isnan(f.mse),
+                      expected < 0 || std::string(test.what) == "NaN sample");
+        }
+}
+
+TEST(BoundedFits, TellWhereThereIsNothingToFit) {
+    Fit f = Sampled(gaussian, {1, 2, 1, 0}, 0, 4, 20, 0.1, 2);
+    f.y.assign(20, nan);
+    EXPECT_EQ(f("gaussian").status, ErrNoUsableFit);
+    f.y.assign(20, 0.0);
+    EXPECT_EQ(f("exponential").status, ErrPolynomialOrderTooHigh) << "no side of the offset";
+    // Equal abscissae give no line, as without bounds, unless the bounds leave but one.
+    f = Sampled(line, {1, 2}, 1, 1, 5, 0.5, 3);
+    EXPECT_FALSE(std::isfinite(f("line").p[0]));
+    f.lower = {0.5, -inf};
+    f.upper = {0.5, inf};
+    f("line");
+    EXPECT_EQ(f.p[0], 0.5);
+    EXPECT_NEAR(f.p[1], (f.y[0] + f.y[1] + f.y[2] + f.y[3] + f.y[4]) / 5 - 0.5, 1e-12);
+}
+
+TEST(BoundedFits, TakeFixedCoefficientsForSamples) {
+    // Nothing free and nothing given: the bounds come back.
+    for (const char *const name : {"line", "exponential", "power", "logarithm", "gaussian"}) {
+        Fit f;
+        f.lower = f.upper = {2, 3, 4, 5};
+        f(name);
+        EXPECT_EQ(f.status, 0) << name;
+        EXPECT_EQ(f.p, Values(f.upper.begin(), f.upper.begin() + static_cast<int>(f.p.size())));
+        EXPECT_EQ(f.mse, 0.0);
+        EXPECT_TRUE(f.fit.empty());
+    }
+    // As many samples as free coefficients: the model goes through them.
+    const struct {
+        const char *model;
+        Values p;
+        std::vector<std::size_t> fixed;
+    } cases[] = {
+        {"line", {2, 3}, {0}},
+        {"line", {2, 3}, {1}},
+        {"logarithm", {2, 3}, {0}},
+        {"logarithm", {2, 3}, {1}},
+        {"exponential", {2, 0.4, 3}, {1}},
+        {"exponential", {2, 0.4, 3}, {0, 1}},
+        {"power", {2, 0.4, 3}, {1, 2}},
+        {"gaussian", {2, 1.5, 1, 3}, {1, 2}},
+        {"gaussian", {2, 1.5, 1, 3}, {2}},
+    };
+    for (const auto &test : cases)
+        for (const uint16_t method : methods) {
+            Fit f;
+            f.lower.assign(test.p.size(), -inf);
+            f.upper.assign(test.p.size(), inf);
+            for (const std::size_t i : test.fixed)
+                f.lower[i] = f.upper[i] = test.p[i];
+            if (std::string(test.model) != "line" && std::string(test.model) != "logarithm")
+                for (const double value : test.p)
+                    f.guess.push_back(1.1 * value);
+            for (std::size_t i = test.fixed.size(); i < test.p.size(); ++i) {
+                f.x.push_back(1.0 + 0.75 * static_cast<double>(f.x.size()));
+                f.y.push_back(models.at(test.model).first(f.x.back(), test.p));
+            }
+            f.w.assign(f.x.size(), 0.5);
+            f.method = method;
+            f(test.model);
+            SCOPED_TRACE(test.model + std::to_string(method));
+            EXPECT_EQ(f.status, 0);
+            for (std::size_t i = 0; i < test.p.size(); ++i)
+                EXPECT_NEAR(f.p[i], test.p[i], method == qx::bisquare ? 1e-2 : 1e-5);
+        }
+}
+
+TEST(BoundedFits, EndAtTheirLimits) {
+    // Nothing but the limit is told of lines, whose results stay.
+    Fit f = Telephones();
+    f.method = qx::leastAbsolute;
+    f.iterations = 1;
+    f("line");
+    EXPECT_EQ(f.status, ErrIterationLimit);
+    EXPECT_EQ(f.iterations, 1);
+    EXPECT_NEAR(f.mse, Cost(f, line, qx::leastAbsolute), 1e-12);
+    EXPECT_NEAR(f.fit[3], line(53, f.p), 1e-12);
+    // Models have a step in each pass even where none is allowed.
+    for (const int32_t limit : {0, -5, 1}) {
+        Fit g = Sampled(exponential, {2, -1, 0.5}, 0, 4, 30, 0.3, 3);
+        g.guess = {1, -0.2, 0};
+        g.iterations = limit;
+        g("exponential");
+        EXPECT_EQ(g.status, 0);
+        EXPECT_GE(g.iterations, 2);
+        EXPECT_LE(g.iterations, 4);
+    }
+}
+
+TEST(BoundedFits, KnowTheBasesOfLogarithms) {
+    for (const double base : {2.0, 10.0, 2.71828, 2.718281828459045}) {
+        Fit f = Sampled(logarithm, {3, 0.7}, 0.5, 9, 12, 0, 1);
+        f.base = base;
+        f.upper = {inf, inf};
+        f.lower = {-inf, 0.9}; // cuts the answer off
+        f("logarithm");
+        const double logOfBase = base == 2.71828 ? 1 : std::log(base);
+        EXPECT_EQ(f.p[1], 0.9);
+        // With b fixed the model is linear in a.
+        double xy = 0, xx = 0;
+        for (std::size_t i = 0; i < f.x.size(); ++i) {
+            const double t = std::log(0.9 * f.x[i]) / logOfBase;
+            xy += t * f.y[i];
+            xx += t * t;
+        }
+        EXPECT_NEAR(f.p[0], xy / xx, 1e-6 * std::fabs(xy / xx)) << base;
+    }
+}
+
+} // namespace
