@@ -121,7 +121,7 @@ def overview(recording):
         text = (f"{counted}, {n / recording.rate:.6g} s at {recording.rate:.10g} samples per "
                 f"second ({recording.rate_source}).")
     else:
-        text = f"{counted}; the sampling rate is not known (--rate sets it)."
+        text = f"{counted}; the sampling rate is not known."
     if unit:
         text += f" Values in {unit}."
     return Section("Recording", text, figures=figures)
@@ -319,6 +319,8 @@ def page(recording, sections):
     out = ["<!DOCTYPE html>", '<html lang="en"><head><meta charset="utf-8">',
            f"<title>{escape(title)}</title><style>{STYLE}</style></head><body>",
            f"<h1>{escape(title)}</h1>"]
+    if recording.choice:
+        out.append(f'<p class="source">{escape(recording.choice)}.</p>')
     if recording.notes:
         out.append(f'<p class="source">{escape(" ".join(recording.notes))}</p>')
     for section in sections:
@@ -338,6 +340,8 @@ def page(recording, sections):
 def lines(recording, sections):
     """The report for the terminal."""
     yield recording.name
+    if recording.choice:
+        yield recording.choice
     for section in sections:
         yield ""
         yield f"{section.title}: {section.text}"

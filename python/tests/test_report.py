@@ -10,13 +10,15 @@ import tempfile
 import unittest
 import xml.etree.ElementTree
 from pathlib import Path
+from unittest import mock
 
 import numpy as np
+import soundfile
 
 PYTHON = Path(__file__).resolve().parent.parent
 sys.path.insert(0, str(PYTHON))
 from qx import __main__ as command  # noqa: E402
-from qx import recording, report  # noqa: E402
+from qx import recording, report, tables  # noqa: E402
 
 ECG = PYTHON.parent / "examples/data/ecg_208_360hz.csv"
 
@@ -52,32 +54,121 @@ def wav(samples, form=1, bits=16, rate=8000, channels=1):
 
 
 class Reading(InFolder):
-    def test_tables(self):
-        for text, values, rate, unit in (
-                ("1\n2.5\n-3e-1\n", [1, 2.5, -0.3], None, ""),
-                ("# at 50 Hz\nforce [N]\n1\n2\n", [1, 2], 50, "N"),
-                ("t;u (mV)\n0;1,5\n0,5;2,5\n1;3,5\n", [1.5, 2.5, 3.5], 2, "mV"),
-                ("time [ms],x\n0,4\n2,5\n4,6\n", [4, 5, 6], 500, ""),
-                ("\ufeffvalue\r\n1\r\n\r\n2\r\n", [1, 2], None, ""),
-                ("time [min],x\n0,4\n1,5\n", [4, 5], 1 / 60, ""),
-                ("t,x\n0,4\n1,5\n3,6\n", [4, 5, 6], None, ""),  # uneven times
-                ("t,x\n0,4\n0,5\n", [4, 5], None, ""),  # times that stand still
-                ("# sampling rate: 2.5k\n1\n", [1], 2500, ""),
-                ("1 10\n2 20\n", [1, 2], None, "")):
-            with self.subTest(text=text):
-                read = recording.read(self.file(text))
-                np.testing.assert_allclose(read.values, values)
-                self.assertEqual((read.rate, read.unit), (rate, unit))
-        for encoding in ("utf-16", "latin-1"):
-            read = recording.read(self.file("# 5 Hz, °C\n1\n2\n".encode(encoding)))
-            self.assertEqual((read.values.tolist(), read.notes), ([1, 2], ["5 Hz, °C"]))
-        two = self.file("a,b\n1,2\n3,4\n")
-        self.assertEqual(recording.read(two, column="b").values.tolist(), [2, 4])
-        self.assertEqual(recording.read(two, column="2").values.tolist(), [2, 4])
-        self.assertEqual(recording.read(self.file("1\n", "tone_44.1khz.csv")).rate, 44100)
-        self.assertEqual(recording.read(self.file("1\n", "tone_8hz.csv"), rate=5.0).rate, 5)
+    def read(self, text, name="data.csv", **options):
+        return recording.read(self.file(text, name), **options)
 
-    def test_wav_files(self):
+    def holds(self, text, values, rate=None, said="", name="data.csv", **options):
+        """What is read, and a part of what is said of it."""
+        with self.subTest(text=text[:60], **options):
+            read = self.read(text, name, **options)
+            np.testing.assert_allclose(read.values[:len(values)], values)
+            self.assertEqual(read.rate, rate)
+            self.assertIn(said, read.choice)
+
+    def test_cells_decimals_and_headers(self):
+        for text, values, said in (
+                ("1\n2.5\n-3e-1\n", [1, 2.5, -0.3], "column 1 of 1; the sampling rate is not known"),
+                ("\ufeffvalue\r\n1\r\n\r\n2\r\n", [1, 2], "column 1 of 1, value"),
+                ("u;v\n1,5;2,5\n2;3\n", [1.5, 2], "u, with decimal commas"),
+                ("u\tv\n1,5\t2,5\n", [1.5], "others: v"),
+                ("u|v\n1|2\n", [1], "others: v"),
+                ("  1.5   2.5\n 3.5   2.5\n", [1.5, 3.5], "others: column 2"),
+                ("u\n1,5\n2,5\n", [1.5, 2.5], "with decimal commas"),
+                ("0,05\n0,5\n", [0.05, 0.5], "with decimal commas"),
+                ("-1,5\n-0,5\n", [-1.5, -0.5], "with decimal commas"),
+                ("1,5\n2\n", [1.5, 2], "with decimal commas"),
+                ("u,v\n1,5\n2,5\n", [1, 2], "others: v"),
+                ("4,-5\n6,5\n", [4, 6], "others: column 2"),
+                ("7,5\n8,9\n9,5\n", [5, 9, 5], "others: column 1 (counts the rows)"),
+                ('"u, N","v"\n"1,5","2,5"\n"3,5","4"\n', [1.5, 3.5], "column 1 of 2, u, N"),
+                ('"1.5"\n"2.5"\n', [1.5, 2.5], "column 1 of 1"),
+                ("1,2,3.5,4\n", [1, 2, 3.5, 4], "4 values on one line"),
+                ("1 2 3\n", [1, 2, 3], "3 values on one line"),
+                ("u,\n1,\n2,\n", [1, 2], "u"),
+                ("label;u\non;1\noff;2\n", [1, 2], "column 2 of 2, u; "),
+                ("Model,ABC\nSerial,12\nforce,load\n1,2\n2,3\n", [1, 2], "force")):
+            self.holds(text, values, said=said)
+        self.holds("1,5\n2,5\n", [1.5, 2.5], decimal="comma")
+        self.holds("1,5\n2,5\n", [1, 2], decimal="point")
+        for encoding in ("utf-16", "latin-1"):
+            read = self.read("# 5 Hz, °C\n1\n2\n".encode(encoding))
+            self.assertEqual((read.values.tolist(), read.notes), ([1, 2], ["5 Hz, °C"]))
+        two = self.file("a [N],b\n1,2\n3,4\n")
+        for column in ("b", "2"):
+            self.assertEqual(recording.read(two, column=column).values.tolist(), [2, 4])
+        self.assertEqual(recording.read(two, column="a").unit, "N")
+
+    def test_time(self):
+        for header, rate in (("Time_s", 0.5), ("time_ms", 500), ("t / ms", 500), ("time [min]", 1 / 120),
+                             ("timestamp", 0.5), ("Zeit (us)", 500000), ("ms", 500), ("seconds", 0.5),
+                             ("elapsed time (s)", 0.5)):
+            self.holds(f"{header},u\n0,4\n2,5\n4,7\n", [4, 5, 7], rate, f"time from column 1, {header}; ")
+        for header in ("T (°C)", "temp", "s1", "total"):  # which are no time
+            self.holds(f"{header},u\n0,4\n2,5\n4,7\n", [0, 2, 4], None, "others: u")
+        for text, values, rate, said in (
+                ("Time (ticks),u\n0,4\n2,5\n4,7\n", [4, 5, 7], None, "unit of the times, ticks, is not"),
+                ("time,a_x,a_y\nms,g,g\n0,1,2\n2,2,3\n", [1, 2], 500, "a_x (g); time from column 1, time (ms)"),
+                (",t (ms),a (g)\n0,0,1\n1,2,2\n2,4,4\n", [1, 2, 4], 500, "column 1 (counts the rows)"),
+                ("sample;u\n1;4\n2;5\n3;7\n", [4, 5, 7], None, "others: sample (counts"),
+                ("0.0,1.5\n0.1,2.5\n0.2,3\n", [1.5, 2.5, 3], 10, "has no name and is taken as seconds"),
+                ("time,u\n2024-02-28T23:59:59.990Z,1\n2024-02-29T00:00:00.000Z,2\n", [1, 2], 100, ""),
+                ("date;clock;u\n2024-01-01;12:00:00,0;1\n2024-01-01;12:00:00,5;2\n", [1, 2], 2,
+                 "time from column 2, clock"),
+                ("timestamp,u\n1700000000000,1\n1700000000010,2\n", [1, 2], 100, "milliseconds since"),
+                ("t,u\n0,4\n1,5\n3,6\n", [4, 5, 6], None, "uneven, steps from 1 to 2 s"),
+                ("t,u\n0,4\n0,5\n", [4, 5], None, "do not rise at sample 2"),
+                ("t,u\n" + "".join(f"{i / 360:.3f},{i}\n" for i in range(721)), [0, 1], 360,
+                 "rounded to 0.001 s"),
+                ("t,u\n" + "".join(f"{i / 100:.1f},{i}\n" for i in range(1000)), [0, 1], 100.1,
+                 "rounded to 0.1 s"),
+                ("t,u\n" + "".join(f"{i + 7 * (i > 30) + 5 * (i > 60)},{i}\n" for i in range(99)), [0, 1],
+                 1, "2 gaps are closed, the longest of 8 s after sample 31")):
+            if rate == 100.1:  # as exact as the last time
+                self.assertAlmostEqual(self.read(text).rate, 100, delta=0.2)
+                continue
+            self.holds(text, values, rate, said)
+
+    def test_a_rate_is_one_that_is_called_so(self):
+        for text, rate in (("# sampling rate: 2.5k\n1\n", 2500), ("# fs = 44.1 kHz\n1\n", 44100),
+                           ("# low-pass, 100 Hz\n# Sample rate (Hz): 2000\n1\n2\n", 2000),
+                           ("# 50 samples per second\n1\n", 50), ("Sample Rate,1000\nu,v\n1,2\n3,4\n", 1000),
+                           ("# low-pass at 100 Hz\n1\n", None), ("force at 50 Hz [N]\n1\n2\n", None),
+                           ("# sampling rate 10 Hz\nt,u\n0,1\n0.5,2\n", 2)):
+            with self.subTest(text=text):
+                self.assertEqual(self.read(text).rate, rate)
+        self.holds("1\n", [1], None, "name has 44.1khz, which may be a rate", name="tone_44.1khz.csv")
+        self.assertEqual(self.read("# fs = 8 Hz\n1\n", rate=5.0).rate, 5)
+
+    def test_missing_values(self):
+        text = "t,u\n0,1\n1,\n2,NA\n3,4\n"
+        self.holds(text, [1, 2, 3, 4], 1, "2 missing values interpolated", missing="interpolate")
+        self.holds(text, [1, 4], 1 / 3, "2 missing values left out", missing="skip")
+        with self.assertRaisesRegex(recording.InputError, ":3: column 2, u: '' where a value is needed"):
+            self.read(text)
+        self.assertRaisesRegex(recording.InputError, "no value is left", self.read, "u\n1\n-\n",
+                               missing="skip", start=1)
+
+    def test_long_tables_and_recordings_are_read_in_parts(self):
+        lines = [f"{i};{i % 7}" for i in range(1000)]
+        lines[700] = "# a comment"
+        text = "t;u\n" + "\n".join(lines)
+        with mock.patch.object(tables, "LINES_AT_ONCE", 97):
+            read = self.read(text)
+            self.assertEqual(read.values.tolist(), [i % 7 for i in range(1000) if i != 700])
+            self.assertRaisesRegex(recording.InputError, ":902: column 2, u: 'x' is not a number", self.read,
+                                   text.replace("\n900;4", "\n900;x"))
+            self.assertRaisesRegex(recording.InputError, ":902: 3 cells where the other lines have 2",
+                                   self.read, text.replace("\n900;4", "\n900;4;5"))
+            with mock.patch.object(recording, "MOST_SAMPLES", 200):
+                read = self.read(text, start=150)
+                self.assertEqual(read.values.tolist(), [i % 7 for i in range(150, 350)])
+                self.assertIn("samples 151 to 350", read.choice)
+                samples = [struct.pack("<h", v) for v in range(500)]
+                read = self.read(wav(samples), "a.wav", start=250)
+                self.assertEqual((32768 * read.values).tolist(), [*range(250, 450)])
+                self.assertIn("samples 251 to 450 of 500", read.choice)
+
+    def test_audio_files(self):
         for samples, form, bits in (
                 ([struct.pack("<h", v) for v in (0, 16384, -32768)], 1, 16),
                 ([bytes([v]) for v in (128, 192, 0)], 1, 8),
@@ -86,24 +177,34 @@ class Reading(InFolder):
                 ([struct.pack("<f", v) for v in (0, 0.5, -1)], 3, 32),
                 ([struct.pack("<d", v) for v in (0, 0.5, -1)], 3, 64)):
             with self.subTest(form=form, bits=bits):
-                read = recording.read(self.file(wav(samples, form, bits), "a.wav"))
+                read = self.read(wav(samples, form, bits), "a.wav")
                 self.assertEqual((read.values.tolist(), read.rate), ([0, 0.5, -1], 8000))
-        extensible = wav([struct.pack("<h", 16384)], 0xFFFE)
-        extensible = extensible.replace(b"fmt \x10\0\0\0", b"fmt \x1a\0\0\0").replace(
-            b"LIST", b"\x08\0\x10\0\x04\0\0\0\x01\0LIST")
-        self.assertEqual(recording.read(self.file(extensible)).values.tolist(), [0.5])
         stereo = wav([struct.pack("<hh", 0, 16384)] * 2, channels=2)
-        self.assertEqual(recording.read(self.file(stereo), column="2").values.tolist(), [0.5, 0.5])
+        read = self.read(stereo, column="2")  # by its content, whatever the name says
+        self.assertEqual(read.values.tolist(), [0.5, 0.5])
+        self.assertEqual(read.choice, "channel 2 of 2; 8000 samples per second, from the header of the "
+                                      "file; others: channel 1")
+        tone = np.sin(np.arange(1000) / 10) / 2
+        for name in ("a.flac", "a.aiff", "a.w64"):
+            soundfile.write(self.folder / name, tone, 22050, "PCM_24")
+            read = recording.read(self.folder / name)
+            np.testing.assert_allclose(read.values, tone, atol=2**-23)
+            self.assertEqual(read.rate, 22050)
 
     def test_bad_input_is_one_line_that_says_what_and_where(self):
         nan_wav = wav([struct.pack("<f", v) for v in (0, float("nan"))], 3, 32)
         for content, reason in (
                 ("", "is empty"), ("# only\n\n", "holds no numbers"), ("a\nb\n", "holds no numbers"),
-                ("1\n2\nnan\n", ":3: 'nan' is not a finite"), ("v\n1\n-inf\n", ":3: '-inf' is not"),
-                ("1\n# c\nx2\n", ":3: 'x2' is not a number"), ("1\n2_0\n", ":2: '2_0' is not"), ("t,u\n0,1\n1,\n", ":3: column 2"),
-                (b"\x7fELF\x01\0\0", ":1: neither"),
-                (b"1\n2\n\x00\n", ":3: neither"), (b"RIFF\0\0\0\0WAVE", "no format"),
-                (wav([]), "no samples"), (wav([b"\0\0"], form=85), "cannot be read"),
+                ("1\n2\nnan\n", ":3: column 1: 'nan' where a value"), ("v\n1\n-inf\n", ":3: column 1, v: '-inf'"),
+                ("1\n# c\nx2\n", ":3: column 1: 'x2' is not a number"), ("1\n2_0\n", ":2: column 1: '2_0'"),
+                ("t,u\n0,1\n1,2\n2\n", ":4: 1 cell where the other lines have 2"),
+                ("1,5\n2,5\n", "'2,5' may be one number with a decimal comma or two"),
+                ("1.234,5\n1.235,6\n", "may be one number with a decimal comma or two"),
+                ("time;x\n0,0;1.234,5\n", "column 2, x, holds '1.234,5'"),
+                ("t,u\n12:00:00,1\n12:00:01,2\n13h,3\n", ":4: column 1, t: '13h' is no time"),
+                (b"\x7fELF\x01\0\0", ":1: neither"), (b"1\n2\n\x00\n", ":3: neither"),
+                (b"RIFF\0\0\0\0WAVE", "cannot be read as audio"), (wav([]), "no samples"),
+                (wav([b"\0\0"], form=85), "cannot be read as audio"),
                 (nan_wav, "sample 2"), ("1e308\n-1e308\n", "more than a plot can span")):
             with self.subTest(content=content[:30]):
                 path = self.file(content)
@@ -113,9 +214,8 @@ class Reading(InFolder):
                 self.assertIn(str(path), err)
                 self.assertIn(reason, err)
                 self.assertFalse((self.folder / "out").exists())
-        for arguments, reason in (([self.folder], "is a folder"),
-                                  ([self.folder / "none.csv"], "no such file"),
-                                  ([self.file("1,2\n"), "--column", "c"], "no column 'c'")):
+        for arguments, reason in (([self.folder / "none.csv"], "no such file"),
+                                  ([self.file("a,b\n1,2\n"), "--column", "c"], "no column 'c'")):
             code, _, err = run("report", *arguments)
             self.assertEqual((code, err.count("\n")), (2, 1))
             self.assertIn(reason, err)

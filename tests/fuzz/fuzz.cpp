@@ -1,10 +1,7 @@
-#include "qx/errors.h"
-#include "qx/frame.h"
-#include "tests/fuzz/content.h"
+#include "tests/fuzz/attack.h"
 #include "tests/fuzz/oddities.h"
+#include "tests/fuzz/recipe_case.h"
 #include "tests/fuzz/thunk.h"
-#include "tests/support/code_list.h"
-#include "tests/support/heap_probe.h"
 #include "tests/support/hostile_host.h"
 
 #include <algorithm>
@@ -12,15 +9,10 @@
 #include <chrono>
 #include <cinttypes>
 #include <csignal>
-#include <cstdarg>
 #include <cstdio>
 #include <cstdlib>
 #include <cstring>
-#include <ctime>
-#include <mutex>
 #include <optional>
-#include <set>
-#include <stdexcept>
 #include <thread>
 #include <unistd.h>
 
@@ -28,11 +20,12 @@
 #include <malloc.h>
 #endif
 
-// Calls every export of the catalogue with arguments of every kind, in a host that refuses, and
-// looks at what holds whatever the arguments are: no byte is touched outside a block or in an
-// input, the sizes of a block never exceed it, codes are those that are documented, the same call
-// gives the same bits, one handle as input and output gives what two give, the workspace gets back
-// what it gave, and time stays bounded.
+// Calls every export of the catalogue with arguments of every kind (each third time with those of
+// its recipe, spoilt here and there), in a host that refuses, and looks at what holds whatever the
+// arguments are: no byte is touched outside a block or in an input, the sizes of a block never
+// exceed it, codes are those that are documented, the same call gives the same bits, one handle as
+// input and output gives what two give, the workspace gets back what it gave, and time stays
+// bounded.
 //
 //     fuzz [--seed N] [--rounds N | --seconds N] [--threads N] [--export NAME] [--round N] [--list]
 //
@@ -42,69 +35,6 @@
 namespace qx::test {
 
 namespace {
-
-#if defined(__SANITIZE_ADDRESS__) || defined(__SANITIZE_THREAD__)
-constexpr double slowness = 30;
-#else
-constexpr double slowness = 1;
-#endif
-constexpr double secondsPerCall = 5 * slowness; // of the processor
-// Neither the host nor the heap gives more in one piece, so that time is bounded by the data and
-// only a loop over a parameter can take long.
-constexpr std::size_t largestBlock = 4U << 20;
-
-struct Options {
-    uint64_t seed = 1;
-    int64_t rounds = 0;
-    double seconds = 0;
-    int threads = 1;
-    int64_t onlyRound = -1;
-    std::string onlyExport;
-};
-Options options;
-
-// What each thread is at, for whoever ends the process.
-struct Current {
-    std::atomic<int64_t> round = -1;
-    std::atomic<const char *> name = nullptr;
-    std::atomic<int64_t> since = 0;
-};
-constexpr int mostThreads = 64;
-Current currents[mostThreads];
-thread_local Current *current = currents;
-
-std::atomic<int> findings = 0;
-
-void Tell(const char *format, ...) {
-    static std::mutex lock;
-    static std::set<std::string> told; // one of each kind from each export
-    char text[300];
-    va_list arguments;
-    va_start(arguments, format);
-    std::vsnprintf(text, sizeof text, format, arguments);
-    va_end(arguments);
-    const HeapProbe::Pause pause;
-    const std::lock_guard hold(lock);
-    if (!told.insert(std::string(current->name) + std::string(text).substr(0, 24)).second)
-        return;
-    ++findings;
-    std::fprintf(stderr, "FOUND: %s: %s   (--seed %" PRIu64 " --export %s --round %" PRId64 ")\n",
-                 current->name.load(), text, options.seed, current->name.load(),
-                 current->round.load());
-}
-
-void TellWhereItEnded() {
-    for (const Current &at : currents)
-        if (at.round >= 0)
-            std::fprintf(stderr, "ENDED (--seed %" PRIu64 " --export %s --round %" PRId64 ")\n",
-                         options.seed, at.name.load(), at.round.load());
-}
-
-double ProcessorSeconds() {
-    timespec now;
-    clock_gettime(CLOCK_THREAD_CPUTIME_ID, &now);
-    return static_cast<double>(now.tv_sec) + 1e-9 * static_cast<double>(now.tv_nsec);
-}
 
 // One argument as it stands before a call; blocks are made from it for each run.
 struct Argument {
@@ -119,10 +49,7 @@ struct Argument {
 struct Scenario {
     const Thunk *thunk;
     std::vector<Argument> arguments;
-    int32_t refuseAt = 0, refusal = 0; // the n-th resize, the host's status
-    int32_t allocationFails = 0;       // the n-th
-    uint32_t workspace = 0;            // bytes; 0 for none
-    bool isUndisturbed() const { return refuseAt == 0 && allocationFails == 0 && workspace == 0; }
+    Disturbance disturbance;
 };
 
 // An array argument before `at` whose handle it may share: one of the two is an output. Arrays that
@@ -179,7 +106,7 @@ Argument SomeArgument(Random &random, const Parameter &parameter, const Sizes &s
 Scenario SomeScenario(Random &random, const Thunk &thunk) {
     const bool isUsual = random.oneIn(2);
     const Sizes sizes = SomeSizes(random);
-    Scenario scenario{&thunk, {}};
+    Scenario scenario{&thunk, {}, {}};
     const bool shares = random.oneIn(6);
     for (std::size_t i = 0; i < thunk.parameters.size(); ++i) {
         const Parameter &parameter = thunk.parameters[i];
@@ -196,16 +123,7 @@ Scenario SomeScenario(Random &random, const Thunk &thunk) {
         }
         scenario.arguments.push_back(std::move(argument));
     }
-    if (random.oneIn(5)) {
-        constexpr int32_t statuses[] = {1, 2, -1, 4711, -20001, -20003, 20001, -2147483647};
-        scenario.refuseAt = random.oneIn(6) ? everyReshape : 1 + random.below(4);
-        scenario.refusal = random.oneOf(statuses);
-    } else if (random.oneIn(5)) {
-        scenario.allocationFails = 1 + random.below(6);
-    } else if (options.threads == 1 && random.oneIn(5)) {
-        constexpr uint32_t regions[] = {64, 300, 1000, 20000, 1U << 20};
-        scenario.workspace = random.oneOf(regions);
-    }
+    scenario.disturbance = SomeDisturbance(random);
     return scenario;
 }
 
@@ -309,11 +227,6 @@ private:
     std::vector<void *> handles_, own_;
 };
 
-struct Outcome {
-    ErrorCode status = 0;
-    uint64_t hash = 0;
-};
-
 class Hash {
 public:
     // A NaN counts as a NaN: its sign and payload are the processor's.
@@ -333,11 +246,6 @@ public:
 private:
     uint64_t value_ = 0x632BE59BD9B4E019U;
 };
-
-const std::map<std::string, Documented> &DocumentedCodes() {
-    static const auto all = ReadCodeList(QX_CODE_LIST);
-    return all;
-}
 
 // Everything that one call is held to by itself.
 class Run {
@@ -368,51 +276,20 @@ public:
     }
 
     Outcome call() {
-        ResetHost(scenario_.refuseAt, scenario_.refusal);
-        Host().largestBlock = largestBlock;
-        Host().freshByte = manner_.rubbish;
-        const double before = ProcessorSeconds();
-        int32_t result = 0;
-        try {
-            const HeapProbe probe(scenario_.allocationFails, largestBlock);
-            result = thunk_.call(values_.data());
-        } catch (const std::exception &error) {
-            Tell("%s", error.what());
-        }
-        const double seconds = ProcessorSeconds() - before;
-        ResetHost();
-        if (seconds > secondsPerCall)
-            Tell("took %.1f s of the processor", seconds);
+        const int32_t result = Attacked(scenario_.disturbance, manner_.rubbish,
+                                        [this] { return thunk_.call(values_.data()); });
         status_ = hasError_ ? error_ : thunk_.returnsCode ? result : 0;
-        checkStatus();
+        const bool shares =
+            std::any_of(scenario_.arguments.begin(), scenario_.arguments.end(),
+                        [](const Argument &argument) { return argument.aliasOf >= 0; });
+        CheckStatus(thunk_.name, status_, scenario_.disturbance, shares);
         checkBlocks();
         return {status_, hash()};
     }
 
 private:
-    void checkStatus() const {
-        const auto documented = DocumentedCodes().find(thunk_.name);
-        if (documented == DocumentedCodes().end() || documented->second.codes.count(status_) != 0)
-            return;
-        // The frame copies an input that is also an output, whatever the export.
-        const bool shares =
-            std::any_of(scenario_.arguments.begin(), scenario_.arguments.end(),
-                        [](const Argument &argument) { return argument.aliasOf >= 0; });
-        if (shares && status_ == ErrOutOfMemory)
-            return;
-        // A limit of the host's own is a refusal like any other.
-        const bool isRefusal =
-            (scenario_.refuseAt != 0 && status_ == scenario_.refusal) || status_ == statusNoMemory;
-        if (!isRefusal || !documented->second.hostStatus)
-            Tell("code %d is not documented", status_);
-    }
     void checkBlocks() const {
-        try {
-            CheckBlocks();
-        } catch (const std::exception &error) { // what comes after it would tell nothing
-            Tell("%s", error.what());
-            std::_Exit(3);
-        }
+        CheckHost();
         for (std::size_t i = 0; i < thunk_.parameters.size(); ++i) {
             const Parameter &parameter = thunk_.parameters[i];
             if (!parameter.isArray())
@@ -474,29 +351,6 @@ private:
     bool hasError_ = false;
 };
 
-// The workspace for one call in one thread.
-class TinyWorkspace {
-public:
-    explicit TinyWorkspace(uint32_t size) : size_(size) {
-        if (size_ == 0)
-            return;
-        InitializeAnalysisWorkspaceH(size_, &status_);
-        EnableAnalysisWorkspaceH(&status_);
-    }
-    ~TinyWorkspace() {
-        if (size_ == 0)
-            return;
-        DisableAnalysisWorkspaceH(&status_);
-        UninitializeAnalysisWorkspaceH(&status_);
-        if (status_.code != 0)
-            Tell("a block of the workspace was not given back (%d)", status_.code);
-    }
-
-private:
-    uint32_t size_;
-    WorkspaceStatus status_ = {0, 0};
-};
-
 Outcome RunAlone(const Scenario &scenario, const Manner &manner) {
 #ifdef __GLIBC__
     if (options.threads == 1)
@@ -510,28 +364,24 @@ struct Tally {
     int64_t calls = 0, successes = 0;
 };
 
-uint64_t SeedOf(const Thunk &thunk, int64_t round) {
+uint64_t SeedOf(const std::string &name, int64_t round) {
     uint64_t seed = options.seed;
-    for (const char *c = thunk.name; *c != 0; ++c)
-        seed = seed * 0x100000001B3U + static_cast<unsigned char>(*c);
+    for (const char c : name)
+        seed = seed * 0x100000001B3U + static_cast<unsigned char>(c);
     return seed * 0x100000001B3U + static_cast<uint64_t>(round);
 }
 
-void RunCase(const Thunk &thunk, int64_t round, Tally &tally) {
-    current->name = thunk.name;
-    current->round = round;
-    current->since = time(nullptr);
-    Random random(SeedOf(thunk, round));
+void RunThunkCase(const Thunk &thunk, Random &random, Tally &tally) {
     Node node;
     for (int32_t left = 1 + random.below(3); left > 0; --left) {
         const Scenario scenario = SomeScenario(random, thunk);
         const bool shares = std::any_of(scenario.arguments.begin(), scenario.arguments.end(),
                                         [](const Argument &a) { return a.aliasOf >= 0; });
-        const bool again = scenario.isUndisturbed() && (shares || random.oneIn(4));
+        const bool again = scenario.disturbance.isNone() && (shares || random.oneIn(4));
         Outcome outcome;
         {
-            const TinyWorkspace workspace(scenario.workspace);
-            if (again || scenario.workspace != 0)
+            const TinyWorkspace workspace(scenario.disturbance.workspace);
+            if (again || scenario.disturbance.workspace != 0)
                 outcome = RunAlone(scenario, {});
             else
                 outcome = Run(scenario, node, {}).call();
@@ -541,24 +391,48 @@ void RunCase(const Thunk &thunk, int64_t round, Tally &tally) {
         if (!again)
             continue;
         const Outcome second = RunAlone(scenario, {shares, 0xC2});
-        if (IsKept(thunk.name, Oddity::OldContentStays) ||
-            IsKept(thunk.name, Oddity::DependsOnState))
-            continue;
-        if (second.hash != outcome.hash || second.status != outcome.status)
-            Tell(shares ? "one handle twice gives another result (%d, apart %d)"
-                        : "the same call gives another result (%d, %d)",
-                 outcome.status, second.status);
+        CheckRepetition(thunk.name, outcome, second, shares);
     }
-    current->round = -1;
 }
 
-// Another thread may switch the workspace at any time.
-void SwitchWorkspace(Random &random) {
-    WorkspaceStatus status = {0, 0};
-    if (random.oneIn(2))
-        EnableAnalysisWorkspaceH(&status);
-    else
-        DisableAnalysisWorkspaceH(&status);
+// An export with the ways to call it.
+struct Subject {
+    std::string name;
+    const Thunk *thunk = nullptr;
+    std::vector<const Recipe *> recipes;
+};
+
+const std::vector<Subject> &AllSubjects() {
+    static const std::vector<Subject> all = [] {
+        std::map<std::string, Subject> byName;
+        for (const Thunk &thunk : AllThunks())
+            byName[thunk.name].thunk = &thunk;
+        for (const Recipe &recipe : AllRecipes())
+            byName[recipe.exportName()].recipes.push_back(&recipe);
+        std::vector<Subject> subjects;
+        for (auto &[name, subject] : byName) {
+            subject.name = name;
+            subjects.push_back(std::move(subject));
+        }
+        return subjects;
+    }();
+    return all;
+}
+
+void RunCase(const Subject &subject, int64_t round, Tally &tally) {
+    current->name = subject.name.c_str();
+    current->since = time(nullptr);
+    current->round = round;
+    Random random(SeedOf(subject.name, round));
+    const auto recipes = static_cast<int32_t>(subject.recipes.size());
+    if (recipes == 0 || (subject.thunk != nullptr && !random.oneIn(3))) {
+        RunThunkCase(*subject.thunk, random, tally);
+    } else {
+        const Recipe &recipe = *subject.recipes[static_cast<std::size_t>(random.below(recipes))];
+        ++tally.calls;
+        tally.successes += RunRecipeCase(random, recipe).status >= 0;
+    }
+    current->round = -1;
 }
 
 void Work(int thread, std::atomic<int64_t> &next, std::vector<Tally> &tallies) {
@@ -566,7 +440,7 @@ void Work(int thread, std::atomic<int64_t> &next, std::vector<Tally> &tallies) {
     const auto end =
         std::chrono::steady_clock::now() + std::chrono::duration<double>(options.seconds);
     Random random(options.seed + static_cast<uint64_t>(thread));
-    const auto exports = static_cast<int64_t>(AllThunks().size());
+    const auto exports = static_cast<int64_t>(AllSubjects().size());
     while (findings < 50) {
         const int64_t number = next++;
         const int64_t round = options.onlyRound >= 0 ? options.onlyRound : number / exports;
@@ -575,23 +449,11 @@ void Work(int thread, std::atomic<int64_t> &next, std::vector<Tally> &tallies) {
         if (isOver)
             return;
         const auto which = static_cast<std::size_t>(number % exports);
-        const Thunk &thunk = AllThunks()[which];
-        if (options.onlyExport.empty() || options.onlyExport == thunk.name)
-            RunCase(thunk, round, tallies[which]);
-        if (options.threads > 1 && random.oneIn(16))
-            SwitchWorkspace(random);
-    }
-}
-
-// Ends a process in which a call does not come back.
-void Watch(const std::atomic<bool> &done) {
-    while (!done) {
-        std::this_thread::sleep_for(std::chrono::milliseconds(200));
-        for (const Current &at : currents)
-            if (at.round >= 0 && static_cast<double>(time(nullptr) - at.since) > 60 * slowness) {
-                TellWhereItEnded();
-                std::_Exit(3);
-            }
+        const Subject &subject = AllSubjects()[which];
+        if (options.onlyExport.empty() || options.onlyExport == subject.name)
+            RunCase(subject, round, tallies[which]);
+        if (options.threads > 1 && random.oneIn(4))
+            ChangeWorkspace(random);
     }
 }
 
@@ -601,15 +463,22 @@ void Die(int signal) {
     std::raise(signal);
 }
 
+bool IsSubject(const std::string &name) {
+    return std::any_of(AllSubjects().begin(), AllSubjects().end(),
+                       [&](const Subject &subject) { return subject.name == name; });
+}
+
 bool Read(int count, char **words) {
     for (int i = 1; i < count; i += 2) {
         const std::string option = words[i];
         const char *value = i + 1 < count ? words[i + 1] : nullptr;
         if (option == "--list") {
+            for (const Subject &subject : AllSubjects())
+                std::printf("%s%s\n", subject.name.c_str(),
+                            subject.thunk == nullptr ? ": by recipe only" : "");
             for (const std::string &name : NotDriven())
-                std::printf("not driven: %s\n", name.c_str());
-            for (const Thunk &thunk : AllThunks())
-                std::printf("%s\n", thunk.name);
+                if (!IsSubject(name))
+                    std::printf("not driven: %s\n", name.c_str());
             std::exit(0);
         }
         if (value == nullptr)
@@ -638,26 +507,20 @@ int Main() {
     std::atomic<int64_t> next = 0;
     std::atomic<bool> done = false;
     std::thread watch([&done] { Watch(done); });
-    WorkspaceStatus status = {0, 0};
-    if (options.threads > 1)
-        InitializeAnalysisWorkspaceH(1U << 20, &status);
     std::vector<std::vector<Tally>> tallies(static_cast<std::size_t>(options.threads),
-                                            std::vector<Tally>(AllThunks().size()));
+                                            std::vector<Tally>(AllSubjects().size()));
     std::vector<std::thread> threads;
     for (int t = 0; t < options.threads; ++t)
         threads.emplace_back([&, t] { Work(t, next, tallies[static_cast<std::size_t>(t)]); });
     for (std::thread &thread : threads)
         thread.join();
-    if (options.threads > 1) {
-        DisableAnalysisWorkspaceH(&status);
-        UninitializeAnalysisWorkspaceH(&status);
-    }
+    EndWorkspace();
     done = true;
     watch.join();
 
     Tally all;
     std::string neverRight;
-    for (std::size_t i = 0; i < AllThunks().size(); ++i) {
+    for (std::size_t i = 0; i < AllSubjects().size(); ++i) {
         Tally one;
         for (const auto &tally : tallies) {
             one.calls += tally[i].calls;
@@ -666,11 +529,11 @@ int Main() {
         all.calls += one.calls;
         all.successes += one.successes;
         if (one.calls > 0 && one.successes == 0)
-            neverRight += std::string(" ") + AllThunks()[i].name;
+            neverRight += std::string(" ") + AllSubjects()[i].name;
     }
     std::printf("seed %" PRIu64 ": %" PRId64 " calls of %zu exports in %d threads, %" PRId64
                 " of them successful, %d findings\n",
-                options.seed, all.calls, AllThunks().size(), options.threads, all.successes,
+                options.seed, all.calls, AllSubjects().size(), options.threads, all.successes,
                 findings.load());
     if (!neverRight.empty())
         std::printf("never successful:%s\n", neverRight.c_str());

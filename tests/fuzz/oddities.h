@@ -27,7 +27,11 @@ constexpr KeptOddity keptOddities[] = {
     {"AutoCorrelation80", Oddity::SizeBeyondBlock, "the resize is not looked at"},
     {"Deconvolution", Oddity::SizeBeyondBlock, "the resize is not looked at"},
     {"ReComplexModulatorH", Oddity::OldContentStays, "where x is empty"},
+    {"ChirpZT_head", Oddity::TimeFollowsNumber, "the direct sum has n count powers"},
+    {"CxChirpZT_head", Oddity::TimeFollowsNumber, "the direct sum has n count powers"},
+    {"SavitzkyGolayCoefH", Oddity::OldContentStays, "differentiators that are not wanted"},
     {"GenLinEqsbySVD2011_head", Oddity::TimeFollowsNumber, "refinements that do not settle"},
+    {"PolyRootsNtBst_head", Oddity::TimeFollowsNumber, "iterations that do not settle"},
 };
 
 inline bool IsKept(const char *name, Oddity oddity) {

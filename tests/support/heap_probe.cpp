@@ -22,13 +22,19 @@ struct Watch {
     std::size_t largest;
     int32_t allocations;
     int32_t live;
+    void (*hook)(); // in place of a failure
 };
 // Of the initial-exec kind, so that reading it never allocates.
 __attribute__((tls_model("initial-exec"))) thread_local Watch watch;
 
 } // namespace
 
-HeapProbe::HeapProbe(int32_t failAt, std::size_t largest) { watch = {true, failAt, largest, 0, 0}; }
+HeapProbe::HeapProbe(int32_t failAt, std::size_t largest) {
+    watch = {true, failAt, largest, 0, 0, nullptr};
+}
+HeapProbe::HeapProbe(int32_t hookAt, void (*hook)()) {
+    watch = {true, hookAt, std::numeric_limits<std::size_t>::max(), 0, 0, hook};
+}
 HeapProbe::~HeapProbe() { watch.on = false; }
 int32_t HeapProbe::allocations() const { return watch.allocations; }
 int32_t HeapProbe::liveAllocations() const { return watch.live; }
@@ -44,7 +50,13 @@ namespace {
 bool Refuses(std::size_t size) {
     if (!watch.on)
         return false;
-    if (++watch.allocations == watch.failAt || size > watch.largest) {
+    const bool isMeant = ++watch.allocations == watch.failAt;
+    if (isMeant && watch.hook != nullptr) {
+        const HeapProbe::Pause pause;
+        watch.hook();
+        return false;
+    }
+    if (isMeant || size > watch.largest) {
         errno = ENOMEM;
         return true;
     }

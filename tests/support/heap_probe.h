@@ -21,6 +21,9 @@ public:
     HeapProbe(const HeapProbe &) = delete;
     HeapProbe &operator=(const HeapProbe &) = delete;
 
+    // Calls `hook` in place of a failure at the n-th allocation, which then goes on.
+    HeapProbe(int32_t hookAt, void (*hook)());
+
     int32_t allocations() const;     // malloc, calloc and realloc, failed ones included
     int32_t liveAllocations() const; // allocations less frees
 

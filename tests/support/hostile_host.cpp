@@ -30,8 +30,9 @@ struct Block {
 
 struct Registry {
     std::recursive_mutex lock;
-    std::map<void *, Block> live; // by handle
-    std::deque<Block> quarantine; // poisoned
+    std::deque<HostRecord> records; // of all threads there have been
+    std::map<void *, Block> live;   // by handle
+    std::deque<Block> quarantine;   // poisoned
     std::map<std::pair<SweepProcedure, void *>, int32_t> sweeps;
 };
 
@@ -101,9 +102,17 @@ bool IsCodeOf(const Block &block, int32_t typeCode, int32_t count) {
 
 } // namespace
 
+// Nothing that is thread_local may have a destructor: on 32-bit Windows the run-time of the
+// compiler frees the memory of such objects before it destroys them, so a destructor would free
+// whatever stands there by then. The records therefore stay to the end of the process.
 HostRecord &Host() {
-    thread_local HostRecord record;
-    return record;
+    thread_local HostRecord *record = nullptr;
+    if (record == nullptr) {
+        const HeapProbe::Pause pause;
+        const std::lock_guard hold(Blocks().lock);
+        record = &Blocks().records.emplace_back();
+    }
+    return *record;
 }
 
 void ResetHost(int32_t failAt, int32_t failStatus) {

@@ -151,6 +151,17 @@ std::vector<Call::Pair> Call::pairsOfOneType() const {
     return found;
 }
 
+bool Call::sizesFitBlocks() const {
+    for (const Arrays *arrays : {&inputs_, &outputs_})
+        for (const auto &[number, array] : *arrays) {
+            const std::vector<int32_t> sizes = array->sizes();
+            if (std::any_of(sizes.begin(), sizes.end(), [](int32_t size) { return size < 0; }) ||
+                (!array->isRecords && array->blockSize() > array->room()))
+                return false;
+        }
+    return true;
+}
+
 bool Call::inputsAreUnchanged() const {
     return std::all_of(inputs_.begin(), inputs_.end(), [](const auto &input) {
         return input.second->role != Role::Input || input.second->isUnchanged();

@@ -197,6 +197,10 @@ public:
     };
     std::vector<Size> inputSizes() const;
     void alter(int input, int dimension, int32_t size) { altered_ = {input, dimension, size}; }
+    // Called with each array that the recipe has filled: what it changes is what the export gets.
+    typedef std::function<void(unsigned char *elements, ElementType, int32_t rows, int32_t cols)>
+        Spoil;
+    void spoil(Spoil spoil) { spoil_ = std::move(spoil); }
     // One array as the input and the output of these numbers: pairs of equal handle types.
     struct Pair {
         int input;
@@ -204,6 +208,7 @@ public:
     };
     std::vector<Pair> pairsOfOneType() const;
     void share(Pair pair) { shared_ = pair; }
+    bool sizesFitBlocks() const;
     bool inputsAreUnchanged() const;
     // After a failure: arrays without elements, scalars NaN or 0, kept arrays as they were.
     bool outputsAreSettled() const;
@@ -217,6 +222,7 @@ private:
     struct Array {
         virtual ~Array() = default;
         virtual const unsigned char *block() const = 0; // sizes and elements
+        virtual std::size_t room() const = 0;           // of the block
         virtual std::size_t blockSize() const = 0;
         virtual std::vector<int32_t> sizes() const = 0;
         virtual ElementType element() const = 0;
@@ -239,6 +245,8 @@ private:
         int32_t size;
     };
 
+    template <class Made>
+    void spoilIfAsked(Made &array, int32_t rows, int32_t cols);
     template <ElementType Code, class Values>
     Handle1D<Code> make(Role role, int number, int32_t count, const Values &values);
     template <ElementType Code, class Values>
@@ -266,6 +274,7 @@ private:
     bool hasError_ = false;
     Alteration altered_ = {-1, 0, 0};
     Pair shared_ = {-1, -1};
+    Spoil spoil_;
 };
 
 // What an export is known to do differently; everything else is checked.

@@ -67,6 +67,7 @@ struct Call::Array1 : Call::Array {
     const unsigned char *block() const override {
         return reinterpret_cast<const unsigned char *>(*array.handle());
     }
+    std::size_t room() const override { return detail::BlockSize(array.handle()); }
     std::size_t blockSize() const override {
         return 4 + static_cast<std::size_t>(array.size()) * sizeof(typename Element<Code>::type);
     }
@@ -81,6 +82,7 @@ struct Call::Array2 : Call::Array {
     const unsigned char *block() const override {
         return reinterpret_cast<const unsigned char *>(*array.handle());
     }
+    std::size_t room() const override { return detail::BlockSize(array.handle()); }
     std::size_t blockSize() const override {
         return 8 + static_cast<std::size_t>(array.size()) * sizeof(typename Element<Code>::type);
     }
@@ -107,6 +109,12 @@ Made &Call::addOutput(int number, Sizes... sizes) {
     return dynamic_cast<Made &>(*held);
 }
 
+template <class Made>
+void Call::spoilIfAsked(Made &made, int32_t rows, int32_t cols) {
+    if (spoil_)
+        spoil_(reinterpret_cast<unsigned char *>(made.array.data()), made.element(), rows, cols);
+}
+
 template <ElementType Code, class Values>
 Handle1D<Code> Call::make(Role role, int number, int32_t count, const Values &values) {
     const HeapProbe::Pause pause;
@@ -118,6 +126,7 @@ Handle1D<Code> Call::make(Role role, int number, int32_t count, const Values &va
     }
     auto array = std::make_unique<Array1<Code>>(size);
     detail::Fill(array->array.data(), array->array.size(), 1, number, values);
+    spoilIfAsked(*array, 1, size);
     const Handle1D<Code> handle = array->array.handle();
     addInput(role, number, std::move(array));
     return handle;
@@ -135,6 +144,7 @@ Handle2D<Code> Call::make(Role role, int number, int32_t rows, int32_t cols, con
     }
     auto array = std::make_unique<Array2<Code>>(first, second);
     detail::Fill(array->array.data(), array->array.size(), array->array.cols(), number, values);
+    spoilIfAsked(*array, first, second);
     const Handle2D<Code> handle = array->array.handle();
     addInput(role, number, std::move(array));
     return handle;

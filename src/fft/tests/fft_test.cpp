@@ -326,7 +326,8 @@ TEST(OneDimensional, InstanceDataIsSharedReleasedAndNeverSwept) {
     EXPECT_EQ(TransformUnreserveProc(&first), 0);
     EXPECT_EQ(first, nullptr);
     EXPECT_EQ(plan->refCount, 1);
-    EXPECT_EQ(TransformUnreserveProc(&first), 0) << "null is allowed";
+    EXPECT_EQ(TransformUnreserveProc(&first), 0) << "a word of null";
+    EXPECT_EQ(TransformUnreserveProc(nullptr), 0) << "and no word";
     EXPECT_EQ(TransformUnreserveProc(&second), 0);
 }
 

@@ -6,8 +6,11 @@
 #include <gtest/gtest.h>
 
 #include <atomic>
+#include <chrono>
 #include <cmath>
 #include <cstdint>
+#include <future>
+#include <latch>
 #include <limits>
 #include <set>
 #include <thread>
@@ -168,6 +171,35 @@ TEST(Plan, IsSharedByThreadsThatBuildItAtOnce) {
         const PlanReference plan(length);
         EXPECT_EQ(plan.get()->refCount, 1) << length;
     }
+}
+
+std::latch *builderStands = nullptr, *builderMayGoOn = nullptr;
+void StandInTheMiddle() {
+    builderStands->count_down();
+    builderMayGoOn->wait();
+}
+
+// While one thread builds a plan, which may take seconds, others get theirs.
+TEST(Plan, OfAnotherLengthIsBuiltMeanwhile) {
+    if (!qx::test::HeapProbe::works())
+        GTEST_SKIP();
+    std::latch stands(1), mayGoOn(1);
+    builderStands = &stands;
+    builderMayGoOn = &mayGoOn;
+    FFTPlan *slow = nullptr;
+    std::thread builder([&] {
+        const qx::test::HeapProbe probe(3, StandInTheMiddle);
+        slow = qx::create_oxfft_table(1 << 10);
+    });
+    stands.wait();
+    auto quick = std::async(std::launch::async, [] { return qx::create_oxfft_table(8); });
+    const bool waits = quick.wait_for(std::chrono::seconds(20)) != std::future_status::ready;
+    mayGoOn.count_down();
+    builder.join();
+    EXPECT_FALSE(waits);
+    qx::destroy_oxfft_table(quick.get());
+    EXPECT_NE(slow, nullptr);
+    qx::destroy_oxfft_table(slow);
 }
 
 // The orders of a prime hold the powers of its smallest generator: all residues, once each.

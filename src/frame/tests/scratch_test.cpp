@@ -229,6 +229,7 @@ TEST(Workspace, ForwardAndReverseReleasesFallBackOverTheWholeRun) {
 }
 
 TEST(Workspace, ResizeKeepsContentAndAStaleTotalSize) {
+    qx::AttachScratchHeap();
     const auto fill = [](void *block, int32_t n) {
         for (int32_t i = 0; i < n; ++i)
             static_cast<unsigned char *>(block)[i] = static_cast<unsigned char>(i + 1);

@@ -44,8 +44,9 @@ public:
     // Right eigenvectors of unit length, in columns. The Schur vectors z are lost.
     ErrorCode writeVectors(const CDB *alpha, CDB *vectors) {
         const int32_t info = lapack::GeneralisedVectors(n_, s_.data(), t_.data(), z_.data());
+        // A form of numbers that overflowed: NaN on the diagonal of t is no real number to LAPACK.
         if (info < 0)
-            return lapack::CodeOf(info);
+            return info == lapack::noMemory ? ErrOutOfMemory : ErrConditionTooHigh;
         if (info > 0)
             return ErrIterationLimit;
         for (int32_t j = 0; j < n_; ++j) {

@@ -90,6 +90,20 @@ TEST(GeneralisedSchur, GivesBothMatricesBackInOrderWithEigenvectors) {
         }
 }
 
+// A Schur form of NaN is no eigenvalue problem any more.
+TEST(GeneralisedSchur, OverflowIsACodeOfItsOwn) {
+    std::vector<CDB> elements = Noisy<CDB>(20, 20, 0), others = Noisy<CDB>(20, 20, 1);
+    for (CDB &z : others)
+        z = {z.re < 0 ? -1.7e308 : 1.7e308, z.im < 0 ? -1.7e308 : 1.7e308};
+    auto a = Matrix(20, 20, elements), b = Matrix(20, 20, others);
+    CDB2DArray q, z, vectors;
+    CDBArray alpha, beta;
+    EXPECT_EQ(CxTmiQZ_head(a.handle(), b.handle(), 0, q.handle(), z.handle(), alpha.handle(),
+                           beta.handle(), vectors.handle()),
+              ErrConditionTooHigh);
+    EXPECT_EQ(vectors.rows(), 0);
+}
+
 TEST(GeneralisedSchur, RevisionsAgree) {
     const std::vector<double> elements = Noisy<double>(6, 6, 0), others = Noisy<double>(6, 6, 1);
     DBL2DArray a(6, 6, elements), b(6, 6, others), c = a, d = b, q, z;

@@ -1,0 +1,39 @@
+#ifndef QX_POLYNOMIAL_ROOTS_H
+#define QX_POLYNOMIAL_ROOTS_H
+
+/* Roots of polynomials. Coefficients stand in ascending powers: element 0 is the constant term, and
+   n coefficients make a polynomial of degree n - 1. */
+
+#include "qx/types.h"
+
+QX_BEGIN_DECLS
+
+/** Improves roots that are known roughly: each real guess by Newton steps, of which the point with
+    the smallest residual stands, and each pair of complex guesses by Bairstow's method, which finds
+    the two roots of a real quadratic factor. `roots` holds one root per guess: the real ones in
+    their order, then the real and then the conjugate pairs of the second kind. Complex guesses stay
+    as they are if the polynomial has fewer than 4 coefficients, and so does one without a partner.
+    Iterations end when a relative change is below the tolerance, or at their limit, with the best
+    values so far. A null array of guesses is an empty one. Where coef is empty, `roots` is emptied.
+    Codes: WarnEmptyResult (coef is empty), ErrOutOfMemory (no memory, or the host refuses
+    `roots`). */
+QX_API ErrorCode PolyRootsNtBst_head(QX_IN DBL1D coef, QX_IN DBL1D realGuesses,
+                                     int32_t newtonMaxIterations, double newtonTolerance,
+                                     QX_IN CDB1D complexGuesses, int32_t bairstowMaxIterations,
+                                     double bairstowTolerance, QX_OUT CDB1D roots);
+
+/** All roots of a complex polynomial in place of its coefficients, in the order in which they are
+    found: Newton's method with a line search (K. Madsen, "A root-finding algorithm based on
+    Newton's method", 1973) and deflation. As many roots come out as the degree says; coefficients
+    of 0 at the top do not count. *maxIterations is how often a search may turn to another direction
+    before it takes a step. Multiple and clustered roots are found as well as the coefficients tell
+    them; CxMultPolyRoots_head is made for these. The code is in *err.
+    Codes: ErrEmptyInput (coef is empty), ErrBadCoefficients (a coefficient is NaN, or the
+    polynomial is constant), ErrOutOfMemory (no memory, or the host refuses the resize),
+    ErrNonFiniteFunction (a search came to NaN), ErrIterationLimit (a search does not converge). */
+QX_API int32_t CxPolyRoots_head(QX_INOUT CDB1D coef, QX_IN const int32_t *maxIterations,
+                                QX_OUT ErrorCode *err);
+
+QX_END_DECLS
+
+#endif

@@ -1,0 +1,27 @@
+#ifndef QX_POLY_COMPLEX_ROOTS_H
+#define QX_POLY_COMPLEX_ROOTS_H
+
+#include "qx/errors.h"
+#include "qx/types.h"
+
+#include <cstdint>
+
+namespace qx {
+
+// All roots of a complex polynomial of n ascending coefficients, in the order in which they are
+// found: Newton's method with a line search and steps that turn where it leads nowhere, after K.
+// Madsen, "A root-finding algorithm based on Newton's method", 1973, and deflation. `roots` has n
+// places and may be `coef`; *rootCount is the degree, which counts no vanishing top coefficients.
+// A search may turn `maxIterations` times between two of its steps.
+//
+// ErrEmptyInput; ErrBadCoefficients: NaN, or a constant; ErrNonFiniteFunction: NaN in a search;
+// ErrIterationLimit; ErrOutOfMemory.
+ErrorCode CxPolynomialRoots(const CDB *coef, int32_t n, int32_t maxIterations, CDB *roots,
+                            int32_t *rootCount);
+
+// c + b x + a x^2 = 0 with a and c other than 0.
+void CxQuadraticRoots(CDB c, CDB b, CDB a, CDB *roots);
+
+} // namespace qx
+
+#endif

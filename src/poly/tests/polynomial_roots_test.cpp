@@ -1,0 +1,273 @@
+#include "qx/polynomial_roots.h"
+
+#include "qx/errors.h"
+#include "tests/support/hostile_host.h"
+#include "tests/support/test_data.h"
+
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <cmath>
+#include <complex>
+#include <cstdlib>
+#include <fstream>
+#include <limits>
+#include <string>
+#include <vector>
+
+namespace {
+
+using qx::test::CDBArray;
+using qx::test::DBLArray;
+typedef std::complex<double> Complex;
+typedef std::vector<Complex> Complexes;
+
+constexpr double epsilon = 0x1p-52;
+constexpr double nan = std::numeric_limits<double>::quiet_NaN();
+
+CDBArray ToHost(const Complexes &values) {
+    std::vector<CDB> elements;
+    for (const Complex &z : values)
+        elements.push_back({z.real(), z.imag()});
+    return CDBArray(elements);
+}
+Complexes Values(const CDBArray &array) {
+    Complexes result;
+    for (const CDB &z : array.values())
+        result.emplace_back(z.re, z.im);
+    return result;
+}
+
+// Ascending coefficients of the product of all (x - root).
+Complexes Product(const Complexes &roots) {
+    typedef std::complex<long double> Long;
+    std::vector<Long> a = {1};
+    for (const Complex &root : roots) {
+        a.insert(a.begin(), 0);
+        for (std::size_t k = 0; k + 1 < a.size(); ++k)
+            a[k] -= Long(root) * a[k + 1];
+    }
+    return Complexes(a.begin(), a.end());
+}
+
+// A polynomial with roots known to more digits than double has.
+struct Case {
+    std::string name;
+    Complexes coefficients;
+    struct Root {
+        Complex value;
+        double condition;
+    };
+    std::vector<Root> roots;
+};
+
+std::vector<Case> ReadCases() {
+    std::ifstream file(qx::test::TestData("polynomials.dat"));
+    const auto number = [&] {
+        std::string word;
+        file >> word;
+        return std::strtod(word.c_str(), nullptr);
+    };
+    const auto complexNumber = [&] {
+        const double re = number();
+        return Complex(re, number());
+    };
+    std::vector<Case> cases;
+    Case next;
+    int degree;
+    while (file >> next.name >> degree) {
+        next.coefficients.clear();
+        next.roots.clear();
+        for (int k = 0; k <= degree; ++k)
+            next.coefficients.push_back(complexNumber());
+        for (int k = 0; k < degree; ++k) {
+            const Complex root = complexNumber();
+            next.roots.push_back({root, number()});
+        }
+        cases.push_back(next);
+    }
+    return cases;
+}
+
+// The largest error over the roots, each taken from its nearest one of those found, relative to the
+// root and in units of its condition number times n epsilon.
+double WorstError(const Case &example, Complexes found) {
+    double worst = 0;
+    for (const auto &[root, condition] : example.roots) {
+        if (found.empty())
+            return HUGE_VAL;
+        const auto distance = [&root = root](const Complex &z) { return std::abs(z - root); };
+        const auto nearest =
+            std::min_element(found.begin(), found.end(), [&](const Complex &a, const Complex &b) {
+                return distance(a) < distance(b);
+            });
+        const double error = distance(*nearest) / (std::abs(root) > 0 ? std::abs(root) : 1);
+        worst = std::max(worst, error / (condition * epsilon * example.roots.size()));
+        found.erase(nearest);
+    }
+    return found.empty() ? worst : HUGE_VAL;
+}
+
+ErrorCode FindAll(const CDBArray &coefficients, int32_t maxIterations) {
+    ErrorCode err = 1;
+    EXPECT_EQ(CxPolyRoots_head(coefficients.handle(), &maxIterations, &err), 0);
+    return err;
+}
+
+TEST(CxPolyRoots, ErrorsAreThoseOfTheCondition) {
+    const std::vector<Case> cases = ReadCases();
+    ASSERT_GT(cases.size(), 35U);
+    for (const Case &example : cases) {
+        const CDBArray array = ToHost(example.coefficients);
+        ASSERT_EQ(FindAll(array, 100), 0) << example.name;
+        // Deflation by roots from the middle of these costs two digits.
+        const bool isHard = example.name == "Chebyshev-30" || example.name == "Legendre-30";
+        EXPECT_LT(WorstError(example, Values(array)), isHard ? 160 : 2) << example.name;
+    }
+}
+
+TEST(CxPolyRoots, ZerosAtBothEndsAreNoPartOfTheSearch) {
+    const auto roots = [](const Complexes &coefficients) {
+        const CDBArray array = ToHost(coefficients);
+        EXPECT_EQ(FindAll(array, 10), 0);
+        return Values(array);
+    };
+    EXPECT_EQ(roots({0, 0, 0, 1}), (Complexes{0, 0, 0}));
+    EXPECT_EQ(roots({0, 0, 6, -3}), (Complexes{0, 0, 2}));
+    EXPECT_EQ(roots({6, -3, 0, 0}), (Complexes{2})) << "the degree is 1";
+    EXPECT_EQ(roots({-1, 0, 1, 0}).size(), 2U);
+    EXPECT_EQ(roots({0, {0, 2}, 1, 0}), (Complexes{0, {0, -2}}));
+}
+
+// The quadratic formula without cancellation: a root near 0 keeps its digits.
+TEST(CxPolyRoots, QuadraticsKeepTheSmallRoot) {
+    const CDBArray array = ToHost({1e-3, 1e9, 1});
+    ASSERT_EQ(FindAll(array, 10), 0);
+    EXPECT_NEAR(array[0].re, -1e9, 1e-6);
+    EXPECT_NEAR(array[1].re * 1e12, -1, 1e-15);
+}
+
+TEST(CxPolyRoots, MultipleRootsEndToo) {
+    for (const int multiplicity : {2, 3, 5}) {
+        Complexes roots;
+        for (const Complex &root : {Complex(0.7, 0.1), Complex(-1.3), Complex(0.2, -1)})
+            roots.insert(roots.end(), multiplicity, root);
+        const CDBArray array = ToHost(Product(roots));
+        ASSERT_EQ(FindAll(array, 100), 0);
+        // A root of multiplicity k moves by the k-th root of a change.
+        for (const Complex &found : Values(array)) {
+            double distance = HUGE_VAL;
+            for (const Complex &root : roots)
+                distance = std::min(distance, std::abs(found - root));
+            EXPECT_LT(distance, 40 * std::pow(epsilon, 1.0 / multiplicity));
+        }
+    }
+}
+
+TEST(CxPolyRoots, Failures) {
+    const auto code = [](const Complexes &coefficients, int32_t maxIterations = 100) {
+        const CDBArray array = ToHost(coefficients);
+        const ErrorCode status = FindAll(array, maxIterations);
+        EXPECT_EQ(array.size(), 0);
+        return status;
+    };
+    EXPECT_EQ(code({}), ErrEmptyInput);
+    EXPECT_EQ(code({5}), ErrBadCoefficients);
+    EXPECT_EQ(code({5, 0, 0}), ErrBadCoefficients);
+    EXPECT_EQ(code({0, 0}), ErrBadCoefficients);
+    EXPECT_EQ(code({1, {0, nan}, 1}), ErrBadCoefficients);
+    EXPECT_EQ(code({1, 1, HUGE_VAL, 1}), ErrNonFiniteFunction);
+    EXPECT_EQ(code({1, 2, 3, 4, 5}, -1), ErrIterationLimit);
+    // So flat around 0 that no direction leads down.
+    Complexes flat(44);
+    flat[0] = -1;
+    flat[43] = 1;
+    EXPECT_EQ(code(flat, INT32_MAX), ErrIterationLimit);
+}
+
+Complexes Polish(const std::vector<double> &coefficients, const std::vector<double> &realGuesses,
+                 const Complexes &complexGuesses, int32_t iterations = 50,
+                 double tolerance = 1e-14) {
+    const DBLArray coef(coefficients), real(realGuesses);
+    const CDBArray complex = ToHost(complexGuesses), roots(1);
+    EXPECT_EQ(PolyRootsNtBst_head(coef.handle(), real.handle(), iterations, tolerance,
+                                  complex.handle(), iterations, tolerance, roots.handle()),
+              0);
+    return Values(roots);
+}
+
+TEST(PolyRootsNtBst, NewtonImprovesEachRealGuess) {
+    // (x - 1) (x - 2) (x + 3)
+    const Complexes roots = Polish({6, -7, 0, 1}, {0.8, 2.3, -2.5, 1.0, 100.0}, {});
+    ASSERT_EQ(roots.size(), 5U);
+    const double expected[] = {1, 2, -3, 1, 2};
+    for (int i = 0; i < 5; ++i) {
+        EXPECT_NEAR(roots[i].real(), expected[i], 1e-14);
+        EXPECT_EQ(roots[i].imag(), 0.0);
+    }
+    EXPECT_EQ(roots[3], Complex(1)) << "a root stays as it is";
+    // A double root is reached as far as the residual tells.
+    EXPECT_NEAR(Polish({1, -2, 1}, {1.5}, {})[0].real(), 1, 1e-7);
+    // Without a real root the point of the smallest residual stands.
+    EXPECT_LT(std::abs(Polish({1, 0, 1}, {0.5}, {}, 30)[0]), 0.5);
+    EXPECT_EQ(Polish({6, -7, 0, 1}, {0.8}, {}, 0)[0], Complex(0.8));
+    EXPECT_NE(Polish({6, -7, 0, 1}, {0.8}, {}, 2)[0], Complex(0.8));
+    EXPECT_EQ(Polish({3}, {0.25}, {})[0], Complex(0.25)) << "a constant";
+}
+
+TEST(PolyRootsNtBst, BairstowImprovesPairs) {
+    // (x^2 + x + 1) (x^2 - 4 x + 13) (x - 1) (x + 2), i.e. pairs -1/2 +- i sqrt(3/4), 2 +- 3 i.
+    const Complexes product =
+        Product({{-0.5, std::sqrt(0.75)}, {-0.5, -std::sqrt(0.75)}, {2, 3}, {2, -3}, 1, -2});
+    std::vector<double> coefficients;
+    for (const Complex &a : product)
+        coefficients.push_back(std::round(a.real()));
+    const Complexes roots = Polish(coefficients, {1.1},
+                                   {{-0.49, 0.88},
+                                    {-0.49, -0.88},
+                                    {0.99, 0},
+                                    {-1.98, 0},
+                                    {2.01, 2.98},
+                                    {2.01, -2.98},
+                                    {7, 8}});
+    ASSERT_EQ(roots.size(), 8U);
+    const Complex expected[] = {
+        1, 1, -2, {-0.5, -std::sqrt(0.75)}, {-0.5, std::sqrt(0.75)}, {2, -3}, {2, 3}, {7, 8}};
+    for (int i = 0; i < 8; ++i)
+        EXPECT_LT(std::abs(roots[i] - expected[i]), 1e-13) << i;
+}
+
+TEST(PolyRootsNtBst, GuessesMayStayAsTheyAre) {
+    const Complexes guesses = {{1, 2}, {3, 4}, {5, 6}};
+    EXPECT_EQ(Polish({2, 3, 1}, {}, guesses), guesses) << "fewer than four coefficients";
+    EXPECT_EQ(Polish({6, -7, 0, 1}, {}, {{9, 9}}), (Complexes{{9, 9}})) << "no partner";
+    EXPECT_TRUE(Polish({6, -7, 0, 1}, {}, {}).empty());
+    // A first change of a tenth or more is not believed.
+    EXPECT_EQ(Polish({6, -7, 0, 1}, {}, {{1.8, 0}, {1.2, 0}}).size(), 2U);
+    EXPECT_EQ(Polish({6, -7, 0, 1}, {}, {{4, 0}, {3, 0}}), (Complexes{4, 3}));
+    // Without iterations the pair is taken for a factor all the same.
+    const Complexes pair = Polish({6, -7, 0, 1}, {}, {{3, 0}, {5, 0}}, 0);
+    EXPECT_EQ(pair, (Complexes{5, 3}));
+}
+
+TEST(PolyRootsNtBst, EmptyAndNullArrays) {
+    const DBLArray none, coef{6, -7, 0, 1}, real{0.8};
+    const CDBArray guesses = ToHost({{1.1, 0}, {1.9, 0}}), roots(3);
+    const auto run = [&](const DBLArray &a, DBL1D realGuesses, CDB1D complexGuesses, CDB1D out) {
+        return PolyRootsNtBst_head(a.handle(), realGuesses, 50, 1e-14, complexGuesses, 50, 1e-14,
+                                   out);
+    };
+    EXPECT_EQ(run(none, real.handle(), guesses.handle(), roots.handle()), WarnEmptyResult);
+    EXPECT_EQ(roots.size(), 0);
+    EXPECT_EQ(run(coef, nullptr, nullptr, roots.handle()), 0);
+    EXPECT_EQ(roots.size(), 0);
+    EXPECT_EQ(run(coef, real.handle(), nullptr, roots.handle()), 0);
+    EXPECT_EQ(roots.size(), 1);
+    // The guesses in place.
+    EXPECT_EQ(run(coef, real.handle(), guesses.handle(), guesses.handle()), 0);
+    ASSERT_EQ(guesses.size(), 3);
+    EXPECT_NEAR(guesses[1].re, 2, 1e-14);
+    EXPECT_NEAR(guesses[2].re, 1, 1e-14);
+}
+
+} // namespace

@@ -1,0 +1,214 @@
+#include "tests/fuzz/attack.h"
+
+#include "qx/errors.h"
+#include "tests/fuzz/oddities.h"
+#include "tests/support/code_list.h"
+#include "tests/support/heap_probe.h"
+#include "tests/support/hostile_host.h"
+
+#include <chrono>
+#include <cinttypes>
+#include <cstdarg>
+#include <cstdio>
+#include <cstdlib>
+#include <ctime>
+#include <mutex>
+#include <set>
+#include <stdexcept>
+#include <thread>
+
+namespace qx::test {
+
+Options options;
+Current currents[mostThreads];
+thread_local Current *current = currents;
+std::atomic<int> findings = 0;
+
+namespace {
+
+#if defined(__SANITIZE_ADDRESS__) || defined(__SANITIZE_THREAD__)
+constexpr double slowness = 30;
+#else
+constexpr double slowness = 1;
+#endif
+constexpr double secondsPerCall = 5 * slowness; // of the processor
+// Neither the host nor the heap gives more in one piece, so that time is bounded by the data and
+// only a loop over a parameter can take long.
+constexpr std::size_t largestBlock = 4U << 20;
+
+double ProcessorSeconds() {
+    timespec now;
+    clock_gettime(CLOCK_THREAD_CPUTIME_ID, &now);
+    return static_cast<double>(now.tv_sec) + 1e-9 * static_cast<double>(now.tv_nsec);
+}
+
+const std::map<std::string, Documented> &DocumentedCodes() {
+    static const auto all = ReadCodeList(QX_CODE_LIST);
+    return all;
+}
+
+} // namespace
+
+void Tell(const char *format, ...) {
+    static std::mutex lock;
+    static std::set<std::string> told; // one of each kind from each export
+    char text[300];
+    va_list arguments;
+    va_start(arguments, format);
+    std::vsnprintf(text, sizeof text, format, arguments);
+    va_end(arguments);
+    const HeapProbe::Pause pause;
+    const std::lock_guard hold(lock);
+    const char *name = current->name != nullptr ? current->name.load() : "the workspace";
+    if (!told.insert(name + std::string(text).substr(0, 24)).second)
+        return;
+    ++findings;
+    std::fprintf(stderr, "FOUND: %s: %s   (--seed %" PRIu64 " --export %s --round %" PRId64 ")\n",
+                 name, text, options.seed, name, current->round.load());
+}
+
+void TellWhereItEnded() {
+    for (const Current &at : currents)
+        if (at.round >= 0)
+            std::fprintf(stderr, "ENDED (--seed %" PRIu64 " --export %s --round %" PRId64 ")\n",
+                         options.seed, at.name.load(), at.round.load());
+}
+
+void Watch(const std::atomic<bool> &done) {
+    while (!done) {
+        std::this_thread::sleep_for(std::chrono::milliseconds(200));
+        for (const Current &at : currents)
+            if (at.round >= 0 && static_cast<double>(time(nullptr) - at.since) > 60 * slowness) {
+                TellWhereItEnded();
+                std::_Exit(3);
+            }
+    }
+}
+
+Disturbance SomeDisturbance(Random &random) {
+    Disturbance some;
+    if (random.oneIn(5)) {
+        constexpr int32_t statuses[] = {1, 2, -1, 4711, -20001, -20003, 20001, -2147483647};
+        some.refuseAt = random.oneIn(6) ? everyReshape : 1 + random.below(4);
+        some.refusal = random.oneOf(statuses);
+    } else if (random.oneIn(5)) {
+        some.allocationFails = 1 + random.below(6);
+    } else if (options.threads == 1 && random.oneIn(5)) {
+        constexpr uint32_t regions[] = {64, 300, 1000, 20000, 1U << 20};
+        some.workspace = random.oneOf(regions);
+    }
+    return some;
+}
+
+int32_t Attacked(const Disturbance &disturbance, unsigned char rubbish,
+                 const std::function<int32_t()> &call) {
+    ResetHost(disturbance.refuseAt, disturbance.refusal);
+    Host().largestBlock = largestBlock;
+    Host().freshByte = rubbish;
+    const double before = ProcessorSeconds();
+    int32_t result = 0;
+    try {
+        const HeapProbe probe(disturbance.allocationFails, largestBlock);
+        result = call();
+    } catch (const std::exception &error) {
+        Tell("%s", error.what());
+    }
+    const double seconds = ProcessorSeconds() - before;
+    ResetHost();
+    if (seconds > secondsPerCall)
+        Tell("took %.1f s of the processor", seconds);
+    return result;
+}
+
+void CheckStatus(const char *name, ErrorCode status, const Disturbance &disturbance, bool shares) {
+    const auto documented = DocumentedCodes().find(name);
+    if (documented == DocumentedCodes().end() || documented->second.codes.count(status) != 0)
+        return;
+    // The frame copies an input that is also an output, whatever the export.
+    if (shares && status == ErrOutOfMemory)
+        return;
+    // A limit of the host's own is a refusal like any other.
+    const bool isRefusal =
+        (disturbance.refuseAt != 0 && status == disturbance.refusal) || status == statusNoMemory;
+    if (!isRefusal || !documented->second.hostStatus)
+        Tell("code %d is not documented", status);
+}
+
+void CheckHost() {
+    try {
+        CheckBlocks();
+    } catch (const std::exception &error) {
+        Tell("%s", error.what());
+        std::_Exit(3);
+    }
+}
+
+void CheckRepetition(const char *name, const Outcome &first, const Outcome &second, bool shares) {
+    if (IsKept(name, Oddity::OldContentStays) || IsKept(name, Oddity::DependsOnState))
+        return;
+    // The others may have filled the region, or switched it off, in between.
+    const bool lacksMemory = first.status == ErrOutOfMemory || second.status == ErrOutOfMemory;
+    if (options.threads > 1 && lacksMemory)
+        return;
+    if (first.hash != second.hash || first.status != second.status)
+        Tell(shares ? "one handle twice gives another result (%d, apart %d)"
+                    : "the same call gives another result (%d, %d)",
+             first.status, second.status);
+}
+
+TinyWorkspace::TinyWorkspace(uint32_t size) : size_(size) {
+    if (size_ == 0)
+        return;
+    InitializeAnalysisWorkspaceH(size_, &status_);
+    EnableAnalysisWorkspaceH(&status_);
+}
+
+TinyWorkspace::~TinyWorkspace() {
+    if (size_ == 0)
+        return;
+    DisableAnalysisWorkspaceH(&status_);
+    UninitializeAnalysisWorkspaceH(&status_);
+    if (status_.code != 0)
+        Tell("a block of the workspace was not given back (%d)", status_.code);
+}
+
+void ChangeWorkspace(Random &random) {
+    WorkspaceStatus status = {0, 0};
+    std::set<ErrorCode> expected = {0};
+    switch (random.below(8)) {
+    case 0:
+    case 1: {
+        constexpr uint32_t regions[] = {1U << 20, 2U << 20, 3U << 20};
+        InitializeAnalysisWorkspaceH(random.oneOf(regions), &status);
+        expected.insert(ErrWorkspaceAlreadyInitialized);
+        expected.insert(ErrOutOfMemory);
+        break;
+    }
+    case 2:
+    case 3:
+        UninitializeAnalysisWorkspaceH(&status);
+        expected.insert(ErrWorkspaceStillInUse);
+        expected.insert(ErrWorkspaceStillEnabled);
+        break;
+    case 4:
+        DisableAnalysisWorkspaceH(&status);
+        expected.insert(ErrWorkspaceNotInitialized);
+        break;
+    default:
+        EnableAnalysisWorkspaceH(&status);
+        expected.insert(ErrWorkspaceNotInitialized);
+    }
+    if (expected.count(status.code) == 0)
+        Tell("the workspace gives %d", status.code);
+}
+
+void EndWorkspace() {
+    WorkspaceStatus status = {0, 0};
+    DisableAnalysisWorkspaceH(&status);
+    status = {0, 0};
+    UninitializeAnalysisWorkspaceH(&status);
+    if (status.code != 0)
+        Tell("blocks of the workspace were not given back (%d)", status.code);
+}
+
+} // namespace qx::test

@@ -1,0 +1,87 @@
+#ifndef QX_TESTS_FUZZ_ATTACK_H
+#define QX_TESTS_FUZZ_ATTACK_H
+
+#include "qx/frame.h"
+#include "tests/fuzz/content.h"
+
+#include <atomic>
+#include <cstdint>
+#include <functional>
+#include <string>
+
+namespace qx::test {
+
+// What happens around a call, whoever makes its arguments, and how a finding is told.
+
+struct Options {
+    uint64_t seed = 1;
+    int64_t rounds = 0;
+    double seconds = 0;
+    int threads = 1;
+    int64_t onlyRound = -1;
+    std::string onlyExport;
+};
+extern Options options;
+
+// What each thread is at, for whoever ends the process.
+struct Current {
+    std::atomic<int64_t> round = -1;
+    std::atomic<const char *> name = nullptr;
+    std::atomic<int64_t> since = 0;
+};
+constexpr int mostThreads = 64;
+extern Current currents[mostThreads];
+extern thread_local Current *current;
+
+extern std::atomic<int> findings;
+__attribute__((format(printf, 1, 2))) void Tell(const char *format, ...);
+void TellWhereItEnded();
+// Ends a process in which a call does not come back.
+void Watch(const std::atomic<bool> &done);
+
+struct Outcome {
+    ErrorCode status = 0;
+    uint64_t hash = 0;
+};
+
+struct Disturbance {
+    int32_t refuseAt = 0, refusal = 0; // the n-th resize, the host's status
+    int32_t allocationFails = 0;       // the n-th
+    uint32_t workspace = 0;            // bytes; 0 for none
+    bool isNone() const { return refuseAt == 0 && allocationFails == 0 && workspace == 0; }
+};
+Disturbance SomeDisturbance(Random &random);
+
+// Makes the call in a host that refuses as told and whose new blocks hold `rubbish`, and looks at
+// its time. Gives the function result.
+int32_t Attacked(const Disturbance &disturbance, unsigned char rubbish,
+                 const std::function<int32_t()> &call);
+// Tells of a code that the export does not document.
+void CheckStatus(const char *name, ErrorCode status, const Disturbance &disturbance, bool shares);
+// Tells of a touched byte outside the blocks, and ends the process: what comes after it would tell
+// nothing.
+void CheckHost();
+// The same call, made twice, has to have the same outcome.
+void CheckRepetition(const char *name, const Outcome &first, const Outcome &second, bool shares);
+
+// The workspace for one call in one thread.
+class TinyWorkspace {
+public:
+    explicit TinyWorkspace(uint32_t size);
+    ~TinyWorkspace();
+    TinyWorkspace(const TinyWorkspace &) = delete;
+    TinyWorkspace &operator=(const TinyWorkspace &) = delete;
+
+private:
+    uint32_t size_;
+    WorkspaceStatus status_ = {0, 0};
+};
+
+// Many threads share one region, which each of them reserves, gives back and switches as it likes.
+void ChangeWorkspace(Random &random);
+// At the end no block may be left in it.
+void EndWorkspace();
+
+} // namespace qx::test
+
+#endif

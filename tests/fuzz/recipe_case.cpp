@@ -1,0 +1,119 @@
+#include "tests/fuzz/recipe_case.h"
+
+#include "tests/fuzz/oddities.h"
+
+#include <algorithm>
+#include <cstring>
+
+namespace qx::test {
+
+namespace {
+
+// How one call differs from its recipe; the same each time it is made.
+struct Spoiling {
+    int32_t n;
+    uint64_t seed;        // of what is put into the arrays
+    bool spoilsContent;   // else the arrays are the recipe's
+    int input, dimension; // whose size is another
+    int32_t size;         // negative for none
+    Disturbance disturbance;
+};
+
+Spoiling SomeSpoiling(Random &random, const Recipe &recipe) {
+    Spoiling some = {};
+    const auto &sizes = recipe.sizes;
+    const int32_t least = *std::min_element(sizes.begin(), sizes.end());
+    const int32_t most =
+        std::max(least, std::min(*std::max_element(sizes.begin(), sizes.end()), 60));
+    some.n = sizes[static_cast<std::size_t>(random.below(static_cast<int32_t>(sizes.size())))];
+    if (some.n > most || random.oneIn(2))
+        some.n = least + random.below(most - least + 1);
+    some.seed = random.bits();
+    some.spoilsContent = random.oneIn(2);
+    some.input = random.below(8); // none, where the call has fewer
+    some.dimension = random.oneIn(3) ? 1 : 0;
+    const int32_t others[] = {0, 1, 2, 3, some.n - 1, some.n + 1, some.n / 2, 2 * some.n};
+    some.size = random.oneIn(2) ? random.oneOf(others) : -1;
+    some.disturbance = SomeDisturbance(random);
+    return some;
+}
+
+const char *NameOf(ElementType element) {
+    switch (element) {
+    case ElementType::I32:
+        return "I32";
+    case ElementType::U8:
+        return "U8";
+    case ElementType::U32:
+        return "U32";
+    case ElementType::SGL:
+    case ElementType::CSG:
+        return "SGL";
+    case ElementType::DBL:
+    case ElementType::CDB:
+        return "DBL";
+    }
+    return "";
+}
+
+// Some elements, or all, get others of one class.
+void SpoilElements(Random &random, unsigned char *elements, ElementType element, int32_t rows,
+                   int32_t cols) {
+    if (random.oneIn(2))
+        return;
+    const int32_t parts =
+        element == ElementType::CDB || element == ElementType::CSG ? 2 * cols : cols;
+    const auto content = static_cast<Content>(random.below(allContents));
+    const std::string name = NameOf(element);
+    const std::vector<unsigned char> others = SomeElements(random, name, rows, parts, content);
+    const std::size_t each = ElementSize(name);
+    const int32_t oneIn = random.oneIn(3) ? 1 : 8;
+    for (std::size_t at = 0; at < others.size(); at += each)
+        if (random.oneIn(oneIn))
+            std::memcpy(elements + at, others.data() + at, each);
+}
+
+Outcome RunOnce(const Recipe &recipe, const Spoiling &spoiling, unsigned char rubbish) {
+    Call call(spoiling.n);
+    Random content(spoiling.seed);
+    if (spoiling.spoilsContent)
+        call.spoil(
+            [&content](unsigned char *elements, ElementType element, int32_t rows, int32_t cols) {
+                const HeapProbe::Pause pause;
+                SpoilElements(content, elements, element, rows, cols);
+            });
+    if (spoiling.size >= 0)
+        call.alter(spoiling.input, spoiling.dimension, spoiling.size);
+    const std::string name = recipe.exportName();
+    const int32_t result =
+        Attacked(spoiling.disturbance, rubbish, [&] { return recipe.run(call); });
+    const ErrorCode status = call.status(result);
+    CheckStatus(name.c_str(), status, spoiling.disturbance, false);
+    CheckHost();
+    if (!call.sizesFitBlocks()) {
+        if (!IsKept(name.c_str(), Oddity::SizeBeyondBlock))
+            Tell("the sizes of an array exceed its block");
+        return {status, 0};
+    }
+    if (!call.inputsAreUnchanged())
+        Tell("an input has changed");
+    return {status, status < 0 || status == statusNoMemory ? 0 : call.outputHash(status)};
+}
+
+} // namespace
+
+Outcome RunRecipeCase(Random &random, const Recipe &recipe) {
+    const Spoiling spoiling = SomeSpoiling(random, recipe);
+    const bool again = spoiling.disturbance.isNone() && random.oneIn(4);
+    Outcome outcome;
+    {
+        const TinyWorkspace workspace(spoiling.disturbance.workspace);
+        outcome = RunOnce(recipe, spoiling, 0x17);
+    }
+    if (again)
+        CheckRepetition(recipe.exportName().c_str(), outcome, RunOnce(recipe, spoiling, 0xC2),
+                        false);
+    return outcome;
+}
+
+} // namespace qx::test
