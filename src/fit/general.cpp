@@ -37,40 +37,71 @@ ErrorCode TimesTranspose(const DBL *a, const DBL *b, int32_t k, DBL *out) {
     return 0;
 }
 
-// H has the singular values and the right vectors of R, and of U only U^T y is asked for.
-ErrorCode SolveByValues(const LinearModel &model, const Elimination &triangle, double relativeCut,
+// Brings the columns of R to a length near 1 by powers of two, whose exponents it gives. Their
+// lengths then cost no digit of the decomposition, where a single one would be dominated by the
+// longest column: powers of x differ by many orders of magnitude.
+void EquilibrateColumns(DBL *r, int32_t k, I32 *exponents) {
+    for (std::ptrdiff_t j = 0; j < k; ++j) {
+        double largest = 0.0;
+        for (std::ptrdiff_t i = 0; i <= j; ++i)
+            largest = std::fabs(r[i * k + j]) > largest ? std::fabs(r[i * k + j]) : largest;
+        int exponent = 0;
+        if (largest != 0.0)
+            std::frexp(largest, &exponent);
+        for (std::ptrdiff_t i = 0; i <= j; ++i)
+            r[i * k + j] = std::ldexp(r[i * k + j], -exponent);
+        exponents[j] = exponent;
+    }
+}
+
+// One exponent for all columns, so that the singular values stay in proportion.
+void ScaleTogether(DBL *r, int32_t k, I32 *exponents) {
+    // The decomposition takes what is far below 1 for zero.
+    const int exponent = BringIntoRange<ElementType::DBL>(r, k, k, k, 1.0);
+    for (int32_t j = 0; j < k; ++j)
+        exponents[j] = exponent;
+}
+
+// H has the singular values and the right vectors of R, and of U only U^T y is asked for. Where
+// none but zeros are left out, the solution is the same for scaled columns, and so is the
+// covariance.
+ErrorCode SolveByValues(const LinearModel &model, const Elimination &triangle, int32_t method,
                         DBL *c, DBL *covariance) {
     const int32_t k = model.k;
     const std::ptrdiff_t square = std::ptrdiff_t{k} * k;
     Scratch<ElementType::DBL> memory;
+    Scratch<ElementType::I32> exponents;
     if (const ErrorCode failed = memory.allocate(3 * int64_t{k} * k + k))
+        return failed;
+    if (const ErrorCode failed = exponents.allocate(k))
         return failed;
     DBL *const r = memory.data(), *const u = r + square, *const v = u + square,
                *const s = v + square;
     CopyTriangle(triangle, k, r);
-    // The decomposition takes what is far below 1 for zero.
-    const int exponent = BringIntoRange<ElementType::DBL>(r, k, k, k, 1.0);
+    if (method == byCutSVD)
+        ScaleTogether(r, k, exponents.data());
+    else
+        EquilibrateColumns(r, k, exponents.data());
     if (const ErrorCode failed = SVDecompose(r, k, k, u, s, v, 0))
         return failed;
-    for (int32_t j = 0; j < k; ++j)
-        s[j] = std::ldexp(s[j], exponent);
 
-    const double cut = relativeCut * s[0];
+    const double cut = method == byCutSVD ? model.n * s[0] * kEpsilon : 0.0;
     Fill(c, k, 0.0);
     for (int32_t j = 0; j < k; ++j) {
         const bool isUsed = s[j] > cut;
         double along = 0.0;
         for (int32_t i = 0; i < k; ++i)
             along += u[std::ptrdiff_t{i} * k + j] * triangle.target(i);
-        const double share = along / s[j];
-        const double inverse = 1.0 / s[j];
+        const double share = along / s[j], inverse = 1.0 / s[j];
         for (int32_t i = 0; i < k; ++i) {
-            DBL &element = v[std::ptrdiff_t{i} * k + j];
+            DBL *const element = v + std::ptrdiff_t{i} * k + j;
             if (isUsed)
-                c[i] += share * element;
-            element = isUsed ? element * inverse : 0.0;
+                c[i] += share * *element;
+            *element = isUsed ? std::ldexp(*element * inverse, -exponents[i]) : 0.0;
         }
     }
+    for (int32_t i = 0; i < k; ++i)
+        c[i] = std::ldexp(c[i], -exponents[i]);
     return covariance == nullptr ? 0 : TimesTranspose(v, v, k, covariance);
 }
 
@@ -158,8 +189,7 @@ ErrorCode SolveLinearModel(const LinearModel &model, int32_t method, DBL *c, DBL
     if (const ErrorCode failed = triangle.reduce(model))
         return failed;
     if (method == bySVD || method == byCutSVD)
-        return SolveByValues(model, triangle, method == byCutSVD ? model.n * kEpsilon : 0.0, c,
-                             covariance);
+        return SolveByValues(model, triangle, method, c, covariance);
     return SolveByTriangle(model, triangle, c, covariance);
 }
 

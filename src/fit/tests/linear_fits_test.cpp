@@ -1,0 +1,698 @@
+#include "fit/elimination.h"
+#include "fit/general.h"
+#include "fit/polynomial.h"
+#include "fit/robust.h"
+#include "fit/tests/least_squares.h"
+#include "qx/qx.h"
+#include "tests/support/recipe.h"
+#include "tests/support/test_data.h"
+
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <cmath>
+#include <fstream>
+#include <map>
+#include <string>
+
+namespace {
+
+using qx::test::DBLArray;
+using qx::test::DBLMatrix;
+using qx::test::I32Array;
+using qx::test::infinity;
+using qx::test::Long;
+using qx::test::MeanSquare;
+using qx::test::nan;
+using qx::test::Noise;
+using qx::test::Rows;
+using qx::test::Samples;
+using qx::test::Solution;
+using qx::test::SolveNormal;
+using qx::test::TestData;
+
+double RelativeError(double found, Long exact) {
+    const Long error = std::fabs(found - exact);
+    return static_cast<double>(exact == 0 ? error : error / std::fabs(exact));
+}
+
+struct GeneralFit {
+    ErrorCode code;
+    Samples c, fit;
+    Rows covariance;
+    double mse;
+};
+template <class Export>
+GeneralFit FitRows(Export fitExport, const Rows &rows, const Samples &y, const Samples &w,
+                   int32_t algorithm, int32_t wantCovariance) {
+    const auto n = static_cast<int32_t>(rows.size());
+    const int32_t k = n > 0 ? static_cast<int32_t>(rows[0].size()) : 0;
+    const DBLMatrix h(n, k), covariance;
+    for (int32_t i = 0; i < n; ++i)
+        for (int32_t j = 0; j < k; ++j)
+            h.data()[i * k + j] = rows[i][j];
+    const DBLArray c, fit;
+    GeneralFit result = {};
+    result.code =
+        fitExport(h.handle(), DBLArray(y).handle(), DBLArray(w).handle(), algorithm, wantCovariance,
+                  c.handle(), fit.handle(), covariance.handle(), &result.mse);
+    result.c = c.values();
+    result.fit = fit.values();
+    for (int32_t i = 0; i < covariance.rows(); ++i) {
+        result.covariance.emplace_back();
+        for (int32_t j = 0; j < covariance.cols(); ++j)
+            result.covariance.back().push_back(covariance.at(i, j));
+    }
+    return result;
+}
+
+struct PolynomialFit {
+    ErrorCode code;
+    Samples c, fit;
+    double mse;
+};
+PolynomialFit FitPowers(const Samples &x, const Samples &y, int32_t order, int32_t algorithm,
+                        const Samples &w = {}, const std::vector<int32_t> &orders = {},
+                        const Samples &values = {}) {
+    const DBLArray fit, c;
+    PolynomialFit result = {};
+    result.code = PolyFit81_head(DBLArray(x).handle(), DBLArray(y).handle(), order,
+                                 DBLArray(w).handle(), algorithm, I32Array(orders).handle(),
+                                 DBLArray(values).handle(), fit.handle(), c.handle(), &result.mse);
+    result.c = c.values();
+    result.fit = fit.values();
+    return result;
+}
+Rows Powers(const Samples &x, const std::vector<int32_t> &orders) {
+    Rows rows;
+    for (const double t : x) {
+        rows.emplace_back();
+        for (const int32_t order : orders)
+            rows.back().push_back(static_cast<double>(std::pow(Long{t}, order)));
+    }
+    return rows;
+}
+
+// NIST's sets.
+
+struct ReferenceSet {
+    bool isPolynomial;
+    Samples c, deviations;
+    double squares;
+    Samples x, y;
+    Rows rows;
+};
+std::map<std::string, ReferenceSet> ReferenceSets() {
+    std::ifstream file(TestData("nist_linear.dat"));
+    std::map<std::string, ReferenceSet> sets;
+    std::string name, kind;
+    for (int n, k, predictors; file >> name >> kind >> n >> k >> predictors;) {
+        ReferenceSet &set = sets[name];
+        set.isPolynomial = kind == "polynomial";
+        set.c.resize(k);
+        set.deviations.resize(k);
+        for (int j = 0; j < k; ++j)
+            file >> set.c[j] >> set.deviations[j];
+        file >> set.squares;
+        for (int i = 0; i < n; ++i) {
+            double y;
+            file >> y;
+            set.y.push_back(y);
+            set.rows.emplace_back(predictors);
+            for (double &value : set.rows.back())
+                file >> value;
+            set.x.push_back(set.rows.back()[0]);
+        }
+        if (set.isPolynomial) {
+            std::vector<int32_t> orders;
+            for (int j = 0; j < k; ++j)
+                orders.push_back(j);
+            set.rows = Powers(set.x, orders);
+        }
+    }
+    return sets;
+}
+
+// The worst coefficient.
+double ErrorOf(const Samples &found, const Samples &exact) {
+    double worst = found.size() == exact.size() ? 0.0 : infinity;
+    for (std::size_t j = 0; j < exact.size() && j < found.size(); ++j)
+        worst = std::max(worst, RelativeError(found[j], exact[j]));
+    return worst;
+}
+
+TEST(LinearFits, ReferenceSetsOfNIST) {
+    struct Bounds {
+        double bySVD, byQR, byLU;
+    };
+    // Filip and Pontius have normal equations beyond double precision.
+    const std::map<std::string, Bounds> bounds = {
+        {"Norris", {2e-12, 2e-12, 4e-12}}, {"Pontius", {2e-12, 1e-12, 4e-11}},
+        {"NoInt1", {1e-15, 1e-15, 1e-15}}, {"NoInt2", {1e-15, 1e-15, 1e-15}},
+        {"Filip", {1e-7, 1e-7, infinity}}, {"Longley", {1e-11, 1e-11, 2e-7}},
+        {"Wampler1", {1e-9, 1e-9, 1e-6}},  {"Wampler2", {1e-12, 1e-12, 4e-9}},
+        {"Wampler3", {1e-9, 1e-9, 1e-6}},  {"Wampler4", {2e-8, 2e-8, 1e-6}},
+        {"Wampler5", {1e-6, 1e-6, 1e-6}},
+    };
+    const auto sets = ReferenceSets();
+    ASSERT_EQ(sets.size(), bounds.size());
+    for (const auto &[name, set] : sets) {
+        SCOPED_TRACE(name);
+        const Bounds &bound = bounds.at(name);
+        const auto order = static_cast<int32_t>(set.c.size()) - 1;
+        for (const auto &[algorithm, limit] :
+             {std::pair(0, bound.bySVD), std::pair(1, bound.byQR), std::pair(2, bound.byQR),
+              std::pair(4, bound.byLU)}) {
+            const GeneralFit general = FitRows(GenLSFit80_head, set.rows, set.y, {}, algorithm, 1);
+            EXPECT_EQ(general.code, 0);
+            EXPECT_LT(ErrorOf(general.c, set.c), limit) << algorithm;
+            if (set.isPolynomial) {
+                EXPECT_LT(ErrorOf(FitPowers(set.x, set.y, order, algorithm).c, set.c), limit)
+                    << algorithm;
+            }
+            if (algorithm != 0)
+                continue;
+            const auto n = static_cast<double>(set.y.size());
+            EXPECT_NEAR(general.mse * n, set.squares, 1e-7 * set.squares + 1e-2 * (order == 5));
+            Samples deviations;
+            for (std::size_t j = 0; j < set.c.size(); ++j)
+                deviations.push_back(std::sqrt(general.covariance[j][j] * set.squares /
+                                               (n - static_cast<double>(set.c.size()))));
+            EXPECT_LT(ErrorOf(deviations, set.deviations), 2e-7);
+        }
+    }
+    const ReferenceSet &norris = sets.at("Norris");
+    const DBLArray y(norris.y);
+    double slope, intercept, mse;
+    EXPECT_EQ(LinFit_head(y.handle(), DBLArray(norris.x).handle(), DBLArray().handle(), &slope,
+                          &intercept, &mse),
+              0);
+    EXPECT_LT(ErrorOf({intercept, slope}, norris.c), 4e-12);
+    EXPECT_LT(RelativeError(mse * 36, norris.squares), 1e-11);
+}
+
+// Random problems.
+
+struct Problem {
+    Rows rows;
+    Samples y, w;
+};
+Problem RandomProblem(int32_t n, int32_t k, uint64_t seed) {
+    Noise noise(seed);
+    Problem problem;
+    for (int32_t i = 0; i < n; ++i) {
+        problem.rows.emplace_back(k);
+        for (double &value : problem.rows.back())
+            value = noise.symmetric();
+        problem.y.push_back(noise.symmetric());
+        problem.w.push_back(0.1 + 2.0 * noise.symmetric()); // of either sign
+    }
+    return problem;
+}
+
+TEST(LinearFits, AllMethodsSolveTheNormalEquations) {
+    // Sizes at and across the blocks of rows that are reduced together.
+    for (const auto &[n, k] :
+         {std::pair(1, 1), std::pair(3, 3), std::pair(20, 4), std::pair(1528, 1),
+          std::pair(1537, 1), std::pair(5000, 5), std::pair(300, 60)}) {
+        const Problem problem = RandomProblem(n, k, static_cast<uint64_t>(n));
+        for (const bool isWeighted : {false, true}) {
+            const Samples w = isWeighted ? problem.w : Samples();
+            const Solution exact = SolveNormal(problem.rows, problem.y, w);
+            for (int32_t algorithm = 0; algorithm < 7; ++algorithm) {
+                SCOPED_TRACE(std::to_string(n) + " " + std::to_string(k) + " " +
+                             std::to_string(algorithm) + (isWeighted ? " weighted" : ""));
+                const GeneralFit found =
+                    FitRows(GenLSFit80_head, problem.rows, problem.y, w, algorithm, 1);
+                ASSERT_EQ(found.code, 0);
+                for (int32_t j = 0; j < k; ++j) {
+                    EXPECT_NEAR(found.c[j], static_cast<double>(exact.c[j]), 2e-12);
+                    for (int32_t l = 0; l < k; ++l)
+                        EXPECT_NEAR(found.covariance[j][l],
+                                    static_cast<double>(exact.covariance[j][l]),
+                                    1e-10 * static_cast<double>(exact.covariance[j][j]));
+                }
+                const auto model = [&](std::size_t i) {
+                    Long f = 0;
+                    for (int32_t j = 0; j < k; ++j)
+                        f += exact.c[j] * problem.rows[i][j];
+                    return f;
+                };
+                EXPECT_NEAR(found.mse, static_cast<double>(MeanSquare(problem.y, w, model)), 1e-13);
+                EXPECT_NEAR(found.fit[n / 2], static_cast<double>(model(n / 2)), 2e-12);
+            }
+        }
+    }
+}
+
+TEST(LinearFits, ColumnsOfAnySizeCostNoDigits) {
+    const Problem problem = RandomProblem(100, 4, 7);
+    const Solution exact = SolveNormal(problem.rows, problem.y, {});
+    Rows scaled = problem.rows;
+    const Samples factors = {0x1p-600, 1.0, 0x1p550, 0x1p-1000};
+    for (Samples &row : scaled)
+        for (int j = 0; j < 4; ++j)
+            row[j] *= factors[j];
+    for (const int32_t algorithm : {0, 1}) {
+        const GeneralFit found = FitRows(GenLSFit80_head, scaled, problem.y, {}, algorithm, 0);
+        for (int j = 0; j < 4; ++j)
+            EXPECT_NEAR(found.c[j] * factors[j], static_cast<double>(exact.c[j]), 2e-15)
+                << algorithm << " " << j;
+    }
+}
+
+TEST(LinearFits, MatricesOfLowRank) {
+    Problem problem = RandomProblem(30, 3, 8);
+    Rows twice = problem.rows, empty = problem.rows;
+    for (int i = 0; i < 30; ++i) {
+        twice[i][2] = 2.0 * twice[i][0];
+        empty[i][1] = 0.0;
+    }
+    // Cut at n eps the shortest of the solutions remains: that for one column, shared out.
+    const GeneralFit shortest = FitRows(GenLSFit80_head, twice, problem.y, {}, 6, 1);
+    Rows two = twice;
+    for (Samples &row : two)
+        row.pop_back();
+    const Solution exact = SolveNormal(two, problem.y, {});
+    EXPECT_NEAR(shortest.c[0], static_cast<double>(exact.c[0]) / 5, 1e-14);
+    EXPECT_NEAR(shortest.c[2], static_cast<double>(exact.c[0]) / 5 * 2, 1e-14);
+    EXPECT_NEAR(shortest.covariance[0][0], static_cast<double>(exact.covariance[0][0]) / 25, 1e-14);
+    // A column of zeros is an exact lack of rank.
+    for (const int32_t algorithm : {0, 6}) {
+        const GeneralFit found = FitRows(GenLSFit80_head, empty, problem.y, {}, algorithm, 1);
+        EXPECT_EQ(found.code, 0);
+        EXPECT_EQ(found.c[1], 0.0);
+        EXPECT_EQ(found.covariance[1][1], 0.0);
+    }
+    for (const int32_t algorithm : {1, 2, 3, 4, 5}) {
+        const GeneralFit found = FitRows(GenLSFit80_head, empty, problem.y, {}, algorithm, 1);
+        EXPECT_EQ(found.code, ErrSingularMatrix) << algorithm;
+        EXPECT_TRUE(found.c.empty() && found.fit.empty() && found.covariance.empty());
+        EXPECT_TRUE(std::isnan(found.mse));
+    }
+}
+
+TEST(LinearFits, ChecksOfMatricesOfTerms) {
+    const Problem problem = RandomProblem(5, 2, 9);
+    const auto code = [&](const Rows &rows, const Samples &y, const Samples &w, int32_t algorithm) {
+        return FitRows(GenLSFit80_head, rows, y, w, algorithm, 0).code;
+    };
+    EXPECT_EQ(code(problem.rows, {1, 2, 3}, {}, 0), ErrSizeMismatch);
+    EXPECT_EQ(code(problem.rows, problem.y, {1, 2}, 0), ErrSizeMismatch);
+    EXPECT_EQ(code({{}, {}}, {1, 2}, {}, 9), ErrOrderNotPositive);
+    EXPECT_EQ(code({{1, 2}}, {1}, {}, 9), ErrPolynomialOrderTooHigh);
+    EXPECT_EQ(code(problem.rows, problem.y, {}, 7), ErrInvalidSelector);
+    EXPECT_EQ(code(problem.rows, problem.y, {}, -1), ErrInvalidSelector);
+    Problem broken = problem;
+    broken.rows[4][1] = nan;
+    for (const auto &[algorithm, expected] :
+         {std::pair(0, ErrNonFiniteInput), std::pair(1, ErrNonFiniteInput),
+          std::pair(4, ErrSingularMatrix), std::pair(5, ErrNonFiniteInput),
+          std::pair(6, ErrNonFiniteInput)}) {
+        EXPECT_EQ(code(broken.rows, problem.y, {}, algorithm), expected) << algorithm;
+        EXPECT_EQ(code(problem.rows, problem.y, {1, 1, nan, 1, 1}, algorithm), expected);
+    }
+    // A target that is not finite is no failure.
+    Samples y = problem.y;
+    y[3] = nan;
+    const GeneralFit lost = FitRows(GenLSFit80_head, problem.rows, y, {}, 0, 0);
+    EXPECT_EQ(lost.code, 0);
+    EXPECT_TRUE(std::isnan(lost.c[0]) && std::isnan(lost.mse));
+    EXPECT_TRUE(lost.covariance.empty());
+
+    // Standard deviations; 0 counts as 1.
+    const GeneralFit byDeviations =
+        FitRows(GenLSFit_head, problem.rows, problem.y, {2, 0, 0.5, -4, 1}, 0, 1);
+    const GeneralFit byWeights =
+        FitRows(GenLSFit80_head, problem.rows, problem.y, {0.25, 1, 4, 0.0625, 1}, 0, 1);
+    EXPECT_EQ(byDeviations.c, byWeights.c);
+    EXPECT_EQ(byDeviations.covariance, byWeights.covariance);
+    EXPECT_EQ(byDeviations.mse, byWeights.mse);
+}
+
+TEST(LinearFits, SolvesUpperTriangles) {
+    const DBLArray r({2, 1, 4, 9, 0.5, -1, 9, 9, 4}), v({8, 1, 8}), x({0, 0, 0});
+    EXPECT_EQ(qx::SolveUpperTriangular(r.data(), 3, v.data(), 3, x.data()), 0);
+    EXPECT_EQ(x.values(), (Samples{-3, 6, 2}));
+    EXPECT_EQ(v[0], 8.0);
+    EXPECT_EQ(qx::SolveUpperTriangular(r.data(), 3, v.data(), 3, nullptr), 0);
+    EXPECT_EQ(v.values(), x.values());
+    for (const double bad : {0.0, nan})
+        for (const int at : {0, 4, 8}) {
+            const DBLArray broken(r.values());
+            broken.data()[at] = bad;
+            EXPECT_EQ(qx::SolveUpperTriangular(broken.data(), 3, v.data(), 3, nullptr),
+                      ErrSingularMatrix);
+        }
+}
+
+// Lines.
+
+struct LineFit {
+    ErrorCode code;
+    double slope, intercept, mse;
+    Samples fit;
+};
+LineFit FitLine(const Samples &x, const Samples &y, const Samples &w = {}) {
+    const DBLArray inOut(y);
+    LineFit line = {};
+    line.code = LinFit_head(inOut.handle(), DBLArray(x).handle(), DBLArray(w).handle(), &line.slope,
+                            &line.intercept, &line.mse);
+    line.fit = inOut.values();
+    return line;
+}
+
+TEST(LinearFits, LinesAreLeastSquares) {
+    Noise noise(3);
+    for (const int32_t n : {2, 3, 10, 1001}) {
+        Samples x, y, w;
+        Rows rows;
+        for (int32_t i = 0; i < n; ++i) {
+            x.push_back(noise.symmetric() + 0.5);
+            y.push_back(2.0 * x[i] - 1.0 + noise.symmetric());
+            w.push_back(noise.symmetric() * 1e100); // the size does not matter
+            rows.push_back({1.0, x[i]});
+        }
+        for (const Samples &weights : {Samples(), w}) {
+            const LineFit line = FitLine(x, y, weights);
+            const Solution exact = SolveNormal(rows, y, weights);
+            const auto model = [&](std::size_t i) { return exact.c[1] * x[i] + exact.c[0]; };
+            EXPECT_EQ(line.code, 0);
+            EXPECT_NEAR(line.slope, static_cast<double>(exact.c[1]), 1e-13);
+            EXPECT_NEAR(line.intercept, static_cast<double>(exact.c[0]), 1e-13);
+            EXPECT_NEAR(line.fit[n - 1], static_cast<double>(model(n - 1)), 1e-13);
+            const auto mse = static_cast<double>(MeanSquare(y, weights, model));
+            EXPECT_NEAR(line.mse, mse, (weights.empty() ? 1.0 : 1e100) * 1e-14);
+
+            // The same numbers without the fit, and y stays.
+            double slope, intercept;
+            ErrorCode err = 1;
+            const DBLArray data(y);
+            EXPECT_EQ(LinFitCoef80_head(data.handle(), DBLArray(x).handle(),
+                                        DBLArray(weights).handle(), &slope, &intercept, &err),
+                      0);
+            EXPECT_EQ(err, 0);
+            EXPECT_EQ(slope, line.slope);
+            EXPECT_EQ(intercept, line.intercept);
+            EXPECT_EQ(data.values(), y);
+        }
+    }
+}
+
+TEST(LinearFits, OddWeightsAndDataOfLines) {
+    const Samples x = {1, 2, 4}, y = {1, 3, 4};
+    EXPECT_EQ(FitLine(x, {1, 2}).code, ErrSizeMismatch);
+    EXPECT_EQ(FitLine(x, y, {1}).code, ErrSizeMismatch);
+    EXPECT_EQ(FitLine({1}, {2}, {nan}).code, ErrFewerThanTwo);
+    EXPECT_EQ(FitLine(x, y, {0, nan, 0}).code, ErrNonFiniteInput);
+    const LineFit one = FitLine(x, y, {0, 0, 3});
+    EXPECT_EQ(one.code, ErrTooFewWeights);
+    EXPECT_TRUE(std::isnan(one.slope) && std::isnan(one.intercept) && std::isnan(one.mse));
+    EXPECT_TRUE(one.fit.empty());
+    EXPECT_EQ(FitLine(x, y, {0, 0, 0}).slope, FitLine(x, y).slope);
+    EXPECT_EQ(FitLine(x, y, {0, 0, 0}).mse, FitLine(x, y).mse);
+    EXPECT_EQ(FitLine(x, y, {-1, 0, 1}).slope, 1.0);
+
+    const LineFit vertical = FitLine({2, 2}, {1, 3});
+    EXPECT_EQ(vertical.code, 0);
+    EXPECT_FALSE(std::isfinite(vertical.slope));
+
+    double slope, intercept;
+    ErrorCode err = 0;
+    EXPECT_EQ(
+        LinFitCoef_head(DBLArray(y).handle(), DBLArray({1, 2}).handle(), &slope, &intercept, &err),
+        0);
+    EXPECT_EQ(err, ErrSizeMismatch);
+    EXPECT_TRUE(std::isnan(slope) && std::isnan(intercept));
+}
+
+// Polynomials.
+
+TEST(LinearFits, FixedTermsOfPolynomials) {
+    Noise noise(5);
+    Samples x, y, w;
+    for (int i = 0; i < 40; ++i) {
+        x.push_back(noise.symmetric());
+        y.push_back(noise.symmetric());
+        w.push_back(noise.symmetric());
+    }
+    // c1 and c3 given (c1 twice: the later value counts; orders 9 and -1 do not).
+    const PolynomialFit found =
+        FitPowers(x, y, 4, 1, w, {1, 9, 3, 1, -1}, {7.0, 5.0, -2.0, 0.5, 3.0});
+    Samples rest = y;
+    for (std::size_t i = 0; i < y.size(); ++i)
+        rest[i] -= 0.5 * x[i] - 2.0 * x[i] * x[i] * x[i];
+    const Solution exact = SolveNormal(Powers(x, {0, 2, 4}), rest, w);
+    ASSERT_EQ(found.code, 0);
+    EXPECT_EQ(found.c[1], 0.5);
+    EXPECT_EQ(found.c[3], -2.0);
+    for (const int j : {0, 1, 2})
+        EXPECT_NEAR(found.c[2 * j], static_cast<double>(exact.c[j]), 1e-14);
+    const auto model = [&](std::size_t i) {
+        Long f = 0;
+        for (int j = 4; j >= 0; --j)
+            f = f * x[i] + found.c[j];
+        return f;
+    };
+    EXPECT_NEAR(found.mse, static_cast<double>(MeanSquare(y, w, model)), 1e-15);
+    EXPECT_NEAR(found.fit[17], static_cast<double>(model(17)), 1e-15);
+
+    // All given: nothing is solved, so the algorithm is not looked at.
+    const PolynomialFit given = FitPowers({1, 2}, {1, 1}, 1, 99, {}, {1, 0}, {3.0, 2.0});
+    EXPECT_EQ(given.code, 0);
+    EXPECT_EQ(given.c, (Samples{2, 3}));
+    EXPECT_EQ(given.fit, (Samples{5, 8}));
+    EXPECT_EQ(given.mse, (16 + 49) / 2.0);
+    EXPECT_EQ(FitPowers({}, {}, 0, 0, {}, {0}, {3.0}).code, ErrEmptyInput);
+}
+
+TEST(LinearFits, HighOrdersOfPolynomials) {
+    Noise noise(6);
+    Samples x, y;
+    for (int i = 0; i < 100; ++i) {
+        x.push_back(2.0 * i / 99.0 - 1.0);
+        y.push_back(noise.symmetric());
+    }
+    const PolynomialFit highest = FitPowers(x, y, 25, 0), capped = FitPowers(x, y, 30, 0);
+    EXPECT_EQ(highest.code, 0);
+    EXPECT_EQ(highest.c.size(), 26U);
+    EXPECT_EQ(capped.code, WarnPolynomialOrderCapped);
+    ASSERT_EQ(capped.c.size(), 31U);
+    for (int j = 0; j < 31; ++j)
+        EXPECT_EQ(capped.c[j], j < 26 ? highest.c[j] : 0.0);
+    EXPECT_EQ(capped.mse, highest.mse);
+
+    // With fixed terms: among the first 26, or the first two free ones of all.
+    std::vector<int32_t> orders;
+    for (int32_t j = 1; j < 28; ++j)
+        orders.push_back(j);
+    const Samples zeros(orders.size(), 0.0);
+    const PolynomialFit two = FitPowers(x, y, 30, 0, {}, orders, zeros);
+    const Solution exact = SolveNormal(Powers(x, {0, 28}), y, {});
+    EXPECT_EQ(two.code, WarnPolynomialOrderCapped);
+    EXPECT_NEAR(two.c[0], static_cast<double>(exact.c[0]), 1e-14);
+    EXPECT_NEAR(two.c[28], static_cast<double>(exact.c[1]), 1e-14);
+    EXPECT_EQ(two.c[29], 0.0);
+    const PolynomialFit few = FitPowers(x, y, 30, 0, {}, {2, 30}, {0.25, 1.0});
+    EXPECT_NE(few.c[25], 0.0);
+    EXPECT_EQ(few.c[26], 0.0);
+    EXPECT_EQ(few.c[2], 0.25);
+    EXPECT_EQ(few.c[30], 1.0);
+    EXPECT_NEAR(
+        few.fit[0],
+        [&] {
+            Long f = 0;
+            for (int j = 30; j >= 0; --j)
+                f = f * x[0] + few.c[j];
+            return static_cast<double>(f);
+        }(),
+        1e-8);
+}
+
+TEST(LinearFits, ChecksOfPolynomials) {
+    const Samples x = {1, 2, 3}, y = {2, 4, 6};
+    EXPECT_EQ(FitPowers(x, {1, 2}, -1, 9).code, ErrSizeMismatch);
+    EXPECT_EQ(FitPowers(x, y, -1, 9, {1}).code, ErrSizeMismatch);
+    EXPECT_EQ(FitPowers(x, y, -1, 9, {}, {1}, {}).code, ErrSizeMismatch);
+    EXPECT_EQ(FitPowers(x, y, -1, 9).code, ErrPolynomialOrderNegative);
+    EXPECT_EQ(FitPowers(x, y, 3, 9).code, ErrPolynomialOrderTooHigh);
+    EXPECT_EQ(FitPowers(x, y, std::numeric_limits<int32_t>::max(), 0).code,
+              ErrPolynomialOrderTooHigh);
+    // Orders that fix nothing count all the same in the first check, and not in the second.
+    EXPECT_EQ(FitPowers(x, y, 3, 0, {}, {9}, {0.0}).code, ErrPolynomialOrderTooHigh);
+    EXPECT_EQ(FitPowers(x, y, 2, 7).code, ErrInvalidSelector);
+    EXPECT_EQ(FitPowers({1, infinity, 3}, y, 1, 0).code, ErrNonFiniteInput);
+    const PolynomialFit failed = FitPowers({1, 1, 1}, y, 2, 4);
+    EXPECT_EQ(failed.code, ErrSingularMatrix);
+    EXPECT_TRUE(failed.c.empty() && failed.fit.empty() && std::isnan(failed.mse));
+
+    const DBLArray fit, c;
+    double mse;
+    EXPECT_EQ(PolyFit_head(DBLArray(x).handle(), DBLArray(y).handle(), 1, 0, fit.handle(),
+                           c.handle(), &mse),
+              0);
+    EXPECT_NEAR(c[0], 0.0, 1e-14);
+    EXPECT_NEAR(c[1], 2.0, 1e-14);
+    EXPECT_EQ(PolyFit80_head(DBLArray(x).handle(), DBLArray(y).handle(), 1, 0,
+                             I32Array({0}).handle(), DBLArray({1.0}).handle(), fit.handle(),
+                             c.handle(), &mse),
+              0);
+    EXPECT_NEAR(c[1], (1 + 6 + 15) / 14.0, 1e-14);
+}
+
+// Robust norms.
+
+TEST(LinearFits, LeastAbsoluteResidualsOfTheStackLoss) {
+    // K. A. Brownlee, "Statistical theory and methodology in science and engineering", 1965.
+    const Samples data = {80, 27, 89, 42, 80, 27, 88, 37, 75, 25, 90, 37, 62, 24, 87, 28, 62,
+                          22, 87, 18, 62, 23, 87, 18, 62, 24, 93, 19, 62, 24, 93, 20, 58, 23,
+                          87, 15, 58, 18, 80, 14, 58, 18, 89, 14, 58, 17, 88, 13, 58, 18, 82,
+                          11, 58, 19, 93, 12, 50, 18, 89, 8,  50, 18, 86, 7,  50, 19, 72, 8,
+                          50, 19, 79, 8,  50, 20, 80, 9,  56, 20, 82, 15, 70, 20, 91, 15};
+    const auto rows = [&](const qx::RowBlock &block) {
+        for (int32_t i = 0; i < block.count; ++i) {
+            block.column(0)[i] = 1.0;
+            for (int32_t j = 0; j < 4; ++j)
+                block.column(j + 1)[i] = data[4 * (block.first + i) + j];
+        }
+    };
+    const auto sumAt = [&](const double *c) {
+        double sum = 0.0;
+        for (int i = 0; i < 21; ++i)
+            sum += std::fabs(data[4 * i + 3] - c[0] - c[1] * data[4 * i] - c[2] * data[4 * i + 1] -
+                             c[3] * data[4 * i + 2]);
+        return sum;
+    };
+    double c[4];
+    ASSERT_EQ(qx::SolveRobustly({rows, 21, 4, nullptr}, qx::leastAbsolute, {1e-9, 0.0, 500}, c), 0);
+    // The minimum, by linear programming.
+    const double best[4] = {-39.68985507, 0.83188406, 0.57391304, -0.06086957};
+    EXPECT_LT(sumAt(c), sumAt(best) * 1.001);
+    for (int j = 0; j < 4; ++j)
+        EXPECT_NEAR(c[j], best[j], 0.02 * std::fabs(best[j]));
+}
+
+TEST(LinearFits, RobustPolynomialsIgnoreOutliers) {
+    Noise noise(11);
+    Samples x, y, w;
+    for (int i = 0; i < 200; ++i) {
+        x.push_back(0.01 * i);
+        y.push_back(1.0 - 2.0 * x[i] + 3.0 * x[i] * x[i] + 0.01 * noise.symmetric());
+        w.push_back(1.0 + 0.5 * noise.symmetric());
+        if (i % 5 == 2)
+            y[i] += 40.0 * noise.positive();
+    }
+    const DBLArray fit(x), c({0, 0, 0});
+    const Samples truth = {1.0, -2.0, 3.0};
+    const DBLArray weights(w);
+    for (const bool isWeighted : {false, true})
+        for (const auto &[norm, bound] :
+             {std::pair(qx::leastSquares, infinity), std::pair(qx::leastAbsolute, 0.01),
+              std::pair(qx::bisquare, 0.01)}) {
+            const DBL *const used = isWeighted ? weights.data() : nullptr;
+            double mse;
+            ASSERT_EQ(qx::FitPolynomial(DBLArray(x).data(), DBLArray(y).data(), used, 200, 2, 0,
+                                        nullptr, nullptr, 0, fit.data(), c.data(), &mse, norm,
+                                        {1e-6, 0.0, qx::robustIterations}),
+                      0);
+            double worst = 0.0;
+            for (int j = 0; j < 3; ++j)
+                worst = std::max(worst, std::fabs(c[j] - truth[j]));
+            EXPECT_LT(worst, bound) << norm;
+            if (norm == qx::leastSquares) {
+                EXPECT_GT(worst, 1.0); // the outliers matter
+            }
+        }
+}
+
+TEST(LinearFits, WeightsOfRobustNorms) {
+    DBLArray out(6);
+    const DBLArray residuals({-2, 1, 0, 0.001, 4, -1}), w({1, -2, 3, 1, 1, 1});
+    ASSERT_EQ(qx::LeastAbsoluteWeights(residuals.data(), w.data(), 6, out.data()), 0);
+    EXPECT_EQ(out.values(), (Samples{0.5, 2, 300, 100, 0.25, 1}));
+    const DBLArray exact({0, 0, 0, 0, 0, 0});
+    ASSERT_EQ(qx::LeastAbsoluteWeights(exact.data(), nullptr, 6, out.data()), 0);
+    EXPECT_EQ(out[0], 1.0 / 1e-07);
+    // Without scale, or where most samples would be lost, the weights stay.
+    const DBLArray adjusted(exact.values());
+    ASSERT_EQ(qx::BisquareWeights(adjusted.data(), w.data(), 6, 2, out.data()), 0);
+    EXPECT_EQ(out.values(), (Samples{1, 2, 3, 1, 1, 1}));
+    const DBLArray spread({-1, 1, 1.2, -1.1, 1e6, 0.9});
+    ASSERT_EQ(qx::BisquareWeights(spread.data(), nullptr, 6, 6, out.data()), 0);
+    EXPECT_EQ(out[4], 1.0);
+    ASSERT_EQ(qx::BisquareWeights(spread.data(), nullptr, 6, 5, out.data()), 0);
+    EXPECT_EQ(out[4], 0.0);
+    EXPECT_GT(out[0], 0.5);
+    const DBLArray broken({1, nan, 2});
+    EXPECT_EQ(qx::BisquareWeights(broken.data(), nullptr, 3, 1, out.data()), ErrNaNInData);
+    EXPECT_EQ(qx::LeastAbsoluteWeights(broken.data(), nullptr, 3, out.data()), ErrNaNInData);
+    // Leverages from 0.9999 on count as one.
+    const DBLArray leverage({0.0, 0.75, 0.9999999, 1.0});
+    qx::LeverageFactors(leverage.data(), nullptr, 4, leverage.data());
+    EXPECT_EQ(leverage[1], 2.0);
+    EXPECT_NEAR(leverage[2], 100.0, 1e-9);
+    EXPECT_EQ(leverage[3], leverage[2]);
+}
+
+// Scores and steps.
+
+TEST(LinearFits, GoodnessOfFit) {
+    double sse, rSquare, rmse;
+    const auto score = [&](const Samples &y, const Samples &fit, const Samples &w, int32_t dof) {
+        return GoodnessOfFit_head(DBLArray(y).handle(), DBLArray(fit).handle(),
+                                  DBLArray(w).handle(), dof, &sse, &rSquare, &rmse);
+    };
+    EXPECT_EQ(score({1, 2, 3, 6}, {1, 3, 3, 5}, {}, 0), 0);
+    EXPECT_EQ(sse, 2.0);
+    EXPECT_EQ(rSquare, 1.0 - 2.0 / 14.0);
+    EXPECT_EQ(rmse, 1.0);
+    EXPECT_EQ(score({1, 2, 3, 6}, {1, 3, 3, 5}, {1, -3, 1, 4}, 1), 0);
+    EXPECT_EQ(sse, 1.0); // weights keep their signs, and the mean is the plain one
+    EXPECT_EQ(rSquare, 1.0 - 1.0 / (4.0 - 3.0 + 0.0 + 36.0));
+    EXPECT_EQ(rmse, 1.0);
+    EXPECT_EQ(score({3, 3}, {3, 3}, {}, 1), 0);
+    EXPECT_EQ(rSquare, 1.0);
+    EXPECT_EQ(score({3, 3}, {3, 4}, {}, 1), 0);
+    EXPECT_EQ(rSquare, infinity);
+
+    EXPECT_EQ(score({}, {1}, {}, 0), ErrEmptyInput);
+    EXPECT_EQ(score({1}, {1, 2}, {}, 0), ErrSizeMismatch);
+    EXPECT_EQ(score({1, 2}, {1, 2}, {1}, 0), ErrSizeMismatch);
+    EXPECT_EQ(score({1}, {1}, {}, 5), ErrFewerThanTwo);
+    EXPECT_EQ(score({1, 2}, {1, 2}, {}, 2), ErrTooFewForParameters);
+    EXPECT_TRUE(std::isnan(sse) && std::isnan(rSquare) && std::isnan(rmse));
+}
+
+TEST(LinearFits, DampedSteps) {
+    const auto step = [](const Samples &coefficients, const Samples &a, const Samples &gradient,
+                         double lambda, Samples *result) {
+        const DBLArray c(coefficients);
+        const auto n = static_cast<int32_t>(gradient.size());
+        const DBLMatrix matrix(n, n);
+        for (std::size_t i = 0; i < a.size(); ++i)
+            matrix.data()[i] = a[i];
+        ErrorCode err = 1;
+        EXPECT_EQ(GetNewCoef_head(c.handle(), matrix.handle(), DBLArray(gradient).handle(), &lambda,
+                                  &err),
+                  err);
+        *result = c.values();
+        return err;
+    };
+    Samples c;
+    // (4, 2; 2, 12) d = (8, 16)
+    EXPECT_EQ(step({1, 1}, {2, 2, 2, 6}, {8, 16}, 1.0, &c), 0);
+    EXPECT_NEAR(c[0], 1.0 + 16.0 / 11.0, 1e-15);
+    EXPECT_NEAR(c[1], 1.0 + 12.0 / 11.0, 1e-15);
+    // A row of tiny elements has the pivot it needs.
+    EXPECT_EQ(step({0, 0}, {1e-200, 2e-200, 1, 1}, {5e-200, 3}, 0.0, &c), 0);
+    EXPECT_NEAR(c[0], 1.0, 1e-15);
+    EXPECT_NEAR(c[1], 2.0, 1e-15);
+    EXPECT_EQ(step({1, 1, 1}, {2, 2, 2, 6}, {8, 16}, 1.0, &c), ErrEmptyInput);
+    EXPECT_EQ(step({}, {}, {}, 1.0, &c), ErrEmptyInput);
+    EXPECT_EQ(step({1, 1}, {nan, 2, 2, 6}, {8, 16}, 1.0, &c), ErrNonFiniteInput);
+    EXPECT_EQ(step({1, 1}, {1, 1, 1, 1}, {8, 16}, 0.0, &c), ErrSingularMatrix);
+    EXPECT_EQ(step({1, nan}, {2, 1, 1, 2}, {8, 16}, 0.0, &c), ErrSingularMatrix);
+    EXPECT_TRUE(c.empty());
+}
+
+} // namespace
