@@ -1,0 +1,521 @@
+#include "filters/remez.h"
+
+#include "frame/constants.h"
+#include "frame/scratch.h"
+
+#include <algorithm>
+#include <cmath>
+
+namespace qx {
+
+namespace {
+
+constexpr int32_t gridDensity = 16; // points per extremum
+constexpr int32_t mostExtrema = 2048;
+constexpr int32_t usualRounds = 100;
+
+struct Bands {
+    int32_t count;
+    const DBL *desired, *weight, *edges;
+    double fs;
+    int32_t type;
+
+    double lower(int32_t band) const { return edges[2 * std::ptrdiff_t{band}] / fs; }
+    double upper(int32_t band) const { return edges[2 * std::ptrdiff_t{band} + 1] / fs; }
+    double firstEdge() const { return edges[0]; }
+    double lastEdge() const { return edges[2 * std::ptrdiff_t{count} - 1]; }
+};
+
+ErrorCode CheckNumber(double value, bool mayBeZero) {
+    if (!std::isfinite(value))
+        return ErrBadDesignField;
+    return value < 0.0 || (value == 0.0 && !mayBeZero) ? ErrBadCutoff : 0;
+}
+
+ErrorCode CheckNumbers(const Bands &bands) {
+    if (const ErrorCode failed = CheckNumber(bands.fs, false))
+        return failed;
+    for (int64_t i = 0; i < 2 * int64_t{bands.count}; ++i)
+        if (const ErrorCode failed = CheckNumber(bands.edges[i], true))
+            return failed;
+    for (int32_t b = 0; b < bands.count; ++b) {
+        if (const ErrorCode failed = CheckNumber(bands.weight[b], false))
+            return failed;
+        if (const ErrorCode failed = CheckNumber(bands.desired[b], true))
+            return failed;
+    }
+    return 0;
+}
+
+// The ends of the bands against the zeros that the symmetry of the taps forces on the response.
+ErrorCode CheckEnds(const Bands &bands, bool isOdd) {
+    const double gap = std::fabs(bands.lastEdge() - 0.5 * bands.fs);
+    if (bands.type == RemezHilbert ? bands.firstEdge() == 0.0 : bands.firstEdge() != 0.0)
+        return ErrBadDesignField;
+    if (bands.type == RemezMultiband) {
+        if (gap > 0.001)
+            return ErrBadDesignField;
+        return !isOdd && bands.desired[bands.count - 1] != 0.0 ? ErrBadTapCount : 0;
+    }
+    if (bands.type != RemezDifferentiator && bands.type != RemezHilbert)
+        return ErrBadDesignField;
+    const double leastGapOfOdd = bands.type == RemezDifferentiator ? 0.01 : 0.001;
+    return (isOdd ? gap < leastGapOfOdd : gap > 0.001) ? ErrBadDesignField : 0;
+}
+
+ErrorCode CheckBands(const Bands &bands, int32_t n) {
+    if (bands.count < 1)
+        return ErrEmptyInput;
+    if (const ErrorCode failed = CheckNumbers(bands))
+        return failed;
+    if (bands.lastEdge() / bands.fs > 0.5)
+        return ErrAboveNyquist;
+    for (int64_t i = 1; i < 2 * int64_t{bands.count}; ++i)
+        if (bands.edges[i] <= bands.edges[i - 1])
+            return ErrBadCutoff;
+    return CheckEnds(bands, n % 2 != 0);
+}
+
+// Points of the frequency axis, with what is desired there and its weight.
+struct Grid {
+    Scratch<ElementType::DBL> frequency, desired, weight;
+    int32_t size = 0;
+
+    ErrorCode allocate(int64_t capacity) {
+        const bool isRefused = frequency.allocate(capacity) != 0 ||
+                               desired.allocate(capacity) != 0 || weight.allocate(capacity) != 0;
+        return isRefused ? ErrOutOfMemory : 0;
+    }
+    void add(const Bands &bands, int32_t band, double f) {
+        const double gain = bands.desired[band], w = bands.weight[band];
+        const bool isSlope = bands.type == RemezDifferentiator;
+        frequency[size] = f;
+        desired[size] = isSlope ? gain * f : gain;
+        weight[size] = isSlope && gain >= 0.0001 ? w / f : w;
+        ++size;
+    }
+};
+
+// Each band from its lower edge in steps; its last point is its upper edge instead.
+ErrorCode LayGrid(const Bands &bands, int32_t nfcns, Grid &grid) {
+    const double step = 0.5 / (gridDensity * nfcns);
+    // All bands together are no wider than one half; rounding and the edges add two a band.
+    if (grid.allocate(int64_t{gridDensity} * nfcns + 2 * int64_t{bands.count} + 1) != 0)
+        return ErrOutOfMemory;
+    for (int32_t b = 0; b < bands.count; ++b) {
+        double f = bands.lower(b);
+        if (b == 0 && bands.type != RemezMultiband && step > f)
+            f = step;
+        const double last = bands.upper(b);
+        for (double next = f + step; next <= last; next = f + step) {
+            grid.add(bands, b, f);
+            f = next;
+        }
+        grid.add(bands, b, last);
+    }
+    return 0;
+}
+
+// A response of n taps is a cosine polynomial times a factor, which goes into what is desired and
+// into the weights.
+double SymmetryFactor(const Bands &bands, bool isOdd, double f) {
+    if (bands.type == RemezMultiband)
+        return isOdd ? 1.0 : std::cos(kPi * f);
+    return isOdd ? std::sin(kTwoPi * f) : std::sin(kPi * f);
+}
+
+void DivideByFactor(const Bands &bands, bool isOdd, int32_t nfcns, Grid &grid) {
+    const bool isZeroAtNyquist = (bands.type == RemezMultiband) != isOdd;
+    const double step = 0.5 / (gridDensity * nfcns);
+    if (isZeroAtNyquist && grid.frequency[grid.size - 1] > 0.5 - step)
+        --grid.size;
+    if (bands.type == RemezMultiband && isOdd)
+        return;
+    for (int32_t k = 0; k < grid.size; ++k) {
+        const double factor = SymmetryFactor(bands, isOdd, grid.frequency[k]);
+        grid.desired[k] = grid.desired[k] / factor;
+        grid.weight[k] = grid.weight[k] * factor;
+    }
+}
+
+// The exchange: a polynomial through r alternating deviations at the extrema ext, whose error over
+// the grid gives the next extrema.
+class Exchange {
+public:
+    Exchange(Grid &grid, int32_t nfcns) : grid_(grid), r_(nfcns + 1) {}
+
+    // Where the rounds run out, *unsettled takes the deviation of the last one.
+    ErrorCode run(int32_t maxIterations, double *unsettled);
+    double deviation() const { return deviation_; }
+    // The polynomial at x = cos(2 pi f).
+    double at(double x) const;
+    // The same, but y[j] in reach of x[j].
+    double near(double x, double reach) const;
+
+private:
+    ErrorCode prepare();
+    ErrorCode interpolate();
+    ErrorCode formWeights();
+    void formDeviation();
+    double error(int32_t l);
+    void evaluateGroup(int32_t group);
+    bool beats(int32_t l, double sign, double level) { return sign * error(l) > level; }
+    int32_t climb(int32_t l, int32_t direction, int32_t end, double sign, double &level);
+    double moveExtremum(int32_t j, int32_t above, double sign, int32_t &below);
+    void exchange();
+    void shiftAtEnds(int32_t first, int32_t last, double levelOfFirst, double levelOfLast);
+
+    Interpolation polynomial() const { return {x_.data(), y_.data(), ad_.data(), r_}; }
+    double signOf(int32_t j) const { return j % 2 == 0 ? nut_ : -nut_; }
+
+    Grid &grid_;
+    int32_t r_;
+    Scratch<ElementType::I32> ext_, exponent_, knownSince_;
+    Scratch<ElementType::DBL> x_, y_, ad_, cosine_, error_;
+    double deviation_ = -1.0, nut_ = 1.0;
+    int32_t changes_ = 0, round_ = 0;
+};
+
+ErrorCode Exchange::prepare() {
+    const int32_t groups = (grid_.size + interpolationGroup - 1) / interpolationGroup;
+    const int64_t evaluated = int64_t{groups} * interpolationGroup;
+    if (ext_.allocate(r_) != 0 || exponent_.allocate(r_) != 0 ||
+        knownSince_.allocate(groups) != 0 || x_.allocate(r_) != 0 || y_.allocate(r_) != 0 ||
+        ad_.allocate(r_) != 0 || cosine_.allocate(evaluated) != 0 ||
+        error_.allocate(evaluated) != 0)
+        return ErrOutOfMemory;
+    for (int32_t k = 0; k < groups * interpolationGroup; ++k)
+        cosine_[k] = std::cos(kTwoPi * grid_.frequency[std::min(k, grid_.size - 1)]);
+    for (int32_t group = 0; group < groups; ++group)
+        knownSince_[group] = -1;
+    const double last = grid_.size - 1;
+    for (int32_t j = 0; j < r_; ++j)
+        ext_[j] = static_cast<int32_t>(j * last / (r_ - 1));
+    ext_[r_ - 1] = grid_.size - 1;
+    return 0;
+}
+
+// The products of some hundred distances leave the range of a double. So powers of 2 are taken out
+// on the way, and all weights get one power in common, which cancels where they are used.
+ErrorCode Exchange::formWeights() {
+    constexpr int32_t step = 512;
+    constexpr double large = 0x1p512, small = 0x1p-512;
+    int32_t least = 0;
+    for (int32_t j = 0; j < r_; ++j) {
+        double product = 1.0;
+        int32_t exponent = 0;
+        for (int32_t k = 0; k < r_; ++k) {
+            if (k != j)
+                product *= x_[j] - x_[k];
+            if (std::fabs(product) < small) {
+                product *= large;
+                exponent -= step;
+            } else if (std::fabs(product) > large) {
+                product *= small;
+                exponent += step;
+            }
+        }
+        if (product == 0.0)
+            return ErrBadDesignField;
+        ad_[j] = 1.0 / product;
+        exponent_[j] = exponent;
+        least = std::min(least, exponent);
+    }
+    for (int32_t j = 0; j < r_; ++j)
+        ad_[j] = std::ldexp(ad_[j], least - exponent_[j]);
+    return 0;
+}
+
+void Exchange::formDeviation() {
+    double above = 0.0, below = 0.0;
+    for (int32_t j = 0; j < r_; ++j) {
+        above += ad_[j] * grid_.desired[ext_[j]];
+        const double part = ad_[j] / grid_.weight[ext_[j]];
+        below += j % 2 == 0 ? part : -part;
+    }
+    deviation_ = above / below;
+    for (int32_t j = 0; j < r_; ++j) {
+        const double allowed = deviation_ / grid_.weight[ext_[j]];
+        y_[j] = j % 2 == 0 ? grid_.desired[ext_[j]] - allowed : grid_.desired[ext_[j]] + allowed;
+    }
+    nut_ = deviation_ > 0.0 ? -1.0 : 1.0;
+    deviation_ = std::fabs(deviation_);
+}
+
+ErrorCode Exchange::interpolate() {
+    for (int32_t j = 0; j < r_; ++j)
+        x_[j] = cosine_[ext_[j]];
+    if (const ErrorCode failed = formWeights())
+        return failed;
+    formDeviation();
+    return 0;
+}
+
+double Exchange::at(double x) const {
+    for (int32_t j = 0; j < r_; ++j)
+        if (x == x_[j])
+            return y_[j];
+    const double places[interpolationGroup] = {x, x, x, x};
+    double values[interpolationGroup];
+    Interpolate(polynomial(), places, values);
+    return values[0];
+}
+
+double Exchange::near(double x, double reach) const {
+    int32_t nearest = 0;
+    for (int32_t j = 1; j < r_; ++j)
+        if (std::fabs(x - x_[j]) < std::fabs(x - x_[nearest]))
+            nearest = j;
+    return std::fabs(x - x_[nearest]) < reach ? y_[nearest] : at(x);
+}
+
+// A group is evaluated when the first of its points is asked for.
+void Exchange::evaluateGroup(int32_t group) {
+    const int32_t first = group * interpolationGroup;
+    double values[interpolationGroup];
+    Interpolate(polynomial(), cosine_.data() + first, values);
+    for (int32_t i = 0; i < interpolationGroup && first + i < grid_.size; ++i) {
+        const int32_t l = first + i;
+        const double value = std::isnan(values[i]) ? at(cosine_[l]) : values[i];
+        error_[l] = (value - grid_.desired[l]) * grid_.weight[l];
+    }
+    knownSince_[group] = round_;
+}
+
+double Exchange::error(int32_t l) {
+    const int32_t group = l / interpolationGroup;
+    if (knownSince_[group] != round_)
+        evaluateGroup(group);
+    return error_[l];
+}
+
+// From l, which beats the level, on to where the error ceases to rise or the end comes; the level
+// becomes that of the summit.
+int32_t Exchange::climb(int32_t l, int32_t direction, int32_t end, double sign, double &level) {
+    level = sign * error(l);
+    while (l + direction != end && beats(l + direction, sign, level)) {
+        l += direction;
+        level = sign * error(l);
+    }
+    ++changes_;
+    return l;
+}
+
+// Moves extremum j within what lies between the next one, `above`, and the one before it, `below`,
+// which becomes what bounds the search for the next one. The result is the error there.
+double Exchange::moveExtremum(int32_t j, int32_t above, double sign, int32_t &below) {
+    const int32_t old = ext_[j];
+    double level = deviation_;
+    if (old + 1 < above && beats(old + 1, sign, level)) {
+        below = ext_[j] = climb(old + 1, 1, above, sign, level);
+        return level;
+    }
+    const int32_t bound = below;
+    below = old;
+    for (int32_t l = old - 1; l > bound; --l) {
+        if (beats(l, sign, level)) {
+            ext_[j] = climb(l, -1, bound, sign, level);
+            return level;
+        }
+        if (changes_ > 0)
+            return level;
+    }
+    if (changes_ > 0)
+        return level;
+    for (int32_t l = old + 2; l < above; ++l)
+        if (beats(l, sign, level)) {
+            below = ext_[j] = climb(l, 1, above, sign, level);
+            return level;
+        }
+    return level;
+}
+
+// An extremum beyond the first or the last that is greater than what would leave at the other end.
+void Exchange::shiftAtEnds(int32_t first, int32_t last, double levelOfFirst, double levelOfLast) {
+    constexpr double clearly = 1.00001;
+    const double signBelow = -signOf(0), signAbove = -signOf(r_ - 1);
+    int32_t newFirst = -1, newLast = -1;
+    double level = levelOfLast * clearly;
+    for (int32_t l = 0; l < first && newFirst < 0; ++l)
+        if (beats(l, signBelow, level))
+            newFirst = climb(l, 1, first, signBelow, level);
+    if (newFirst >= 0)
+        levelOfFirst = std::max(levelOfFirst, level);
+    level = levelOfFirst * clearly;
+    for (int32_t l = grid_.size - 1; l > last && newLast < 0; --l)
+        if (beats(l, signAbove, level))
+            newLast = climb(l, -1, last, signAbove, level);
+
+    if (newLast >= 0) {
+        for (int32_t j = 0; j + 1 < r_; ++j)
+            ext_[j] = ext_[j + 1];
+        ext_[r_ - 1] = newLast;
+    } else if (newFirst >= 0) {
+        for (int32_t j = r_ - 1; j > 0; --j)
+            ext_[j] = ext_[j - 1];
+        ext_[0] = newFirst;
+    }
+}
+
+void Exchange::exchange() {
+    changes_ = 0;
+    const int32_t first = ext_[0], last = ext_[r_ - 1];
+    int32_t below = -1;
+    double levelOfFirst = 0.0, level = 0.0;
+    for (int32_t j = 0; j < r_; ++j) {
+        const int32_t above = j + 1 < r_ ? ext_[j + 1] : grid_.size;
+        level = moveExtremum(j, above, signOf(j), below);
+        if (j == 0)
+            levelOfFirst = level;
+    }
+    const int32_t newFirst = ext_[0], newLast = ext_[r_ - 1];
+    shiftAtEnds(std::min(first, newFirst), std::max(last, newLast), levelOfFirst, level);
+}
+
+ErrorCode Exchange::run(int32_t maxIterations, double *unsettled) {
+    if (const ErrorCode failed = prepare())
+        return failed;
+    double before = -1.0;
+    for (int32_t left = maxIterations - 1; left > 0; --left, ++round_) {
+        if (round_ > 0 && changes_ == 0 && std::fabs(deviation_ - before) < 1e-09)
+            return 0;
+        before = deviation_;
+        if (const ErrorCode failed = interpolate())
+            return failed;
+        if (!(deviation_ >= before)) // the exchange must never lose
+            return ErrBadDesignField;
+        exchange();
+    }
+    if (round_ > 0)
+        *unsettled = deviation_;
+    return ErrBadDesignField;
+}
+
+// What is left after the exchange: the coefficients of the polynomial in cos(2 pi k f), and the
+// taps that they are.
+
+// Points at which the polynomial is sampled, mapped onto what the grid covers: its cosine is
+// (sample - bb) / aa.
+struct Mapping {
+    double aa = 1.0, bb = 0.0;
+    Mapping() = default;
+    explicit Mapping(const Grid &grid) {
+        const double first = std::cos(kTwoPi * grid.frequency[0]);
+        const double last = std::cos(kTwoPi * grid.frequency[grid.size - 1]);
+        aa = 2.0 / (first - last);
+        bb = -(first + last) / (first - last);
+    }
+};
+
+// The sum of alpha[k] T_k(aa x + bb) as one of T_k(x), T the Chebyshev polynomials, by Clenshaw's
+// recurrence on whole polynomials. `work` holds 2 n values.
+void MapBack(const Mapping &mapping, int32_t n, DBL *alpha, DBL *work) {
+    DBL *p = work, *q = work + n; // the sums from k on, and from k + 1 on
+    for (int32_t i = 0; i < 2 * n; ++i)
+        work[i] = 0.0;
+    for (int32_t k = n - 1; k >= 0; --k) {
+        // (1 or 2) (aa x + bb) p - q + alpha[k]; x T_i is half of T_(i-1) + T_(i+1).
+        const double twice = k == 0 ? 1.0 : 2.0;
+        for (int32_t i = 0; i < n; ++i)
+            q[i] = twice * mapping.bb * p[i] - q[i];
+        const double half = 0.5 * twice * mapping.aa;
+        for (int32_t i = 0; i + 1 < n; ++i) {
+            q[i + 1] += (i == 0 ? 2.0 * half : half) * p[i];
+            q[i] += half * p[i + 1];
+        }
+        q[0] += alpha[k];
+        DBL *const latest = q;
+        q = p;
+        p = latest;
+    }
+    for (int32_t i = 0; i < n; ++i)
+        alpha[i] = p[i];
+}
+
+ErrorCode FindCoefficients(const Exchange &exchange, const Mapping &mapping, bool isMapped,
+                           int32_t nfcns, DBL *alpha) {
+    const int32_t period = 2 * nfcns - 1;
+    Scratch<ElementType::DBL> cosines, samples;
+    if (cosines.allocate(period) != 0 || samples.allocate(2 * int64_t{nfcns}) != 0)
+        return ErrOutOfMemory;
+    for (int32_t j = 0; j < period; ++j)
+        cosines[j] = std::cos(kTwoPi * j / period);
+    for (int32_t j = 0; j < nfcns; ++j)
+        samples[j] = exchange.near((cosines[j] - mapping.bb) / mapping.aa, 1e-06);
+    for (int32_t k = 0; k < nfcns; ++k) {
+        double sum = 0.0;
+        for (int32_t j = 1, at = k; j < nfcns; ++j) {
+            sum += samples[j] * cosines[at]; // at is j k less whole periods
+            at += at + k < period ? k : k - period;
+        }
+        alpha[k] = (samples[0] + 2.0 * sum) * (k == 0 ? 1.0 : 2.0) / period;
+    }
+    if (isMapped)
+        MapBack(mapping, nfcns, alpha, samples.data());
+    return 0;
+}
+
+// The first half of the taps, of a sum of alpha[k] cos(2 pi k f) times the factor of the symmetry,
+// which adds or subtracts neighbours. The other half mirrors it.
+void FormTaps(const DBL *alpha, int32_t nfcns, int32_t type, int32_t n, DBL *h) {
+    const bool isOdd = n % 2 != 0, isSymmetric = type == RemezMultiband;
+    const int32_t distance = isOdd ? 2 : 1; // of the neighbours
+    const auto coefficient = [&](int32_t k) { return k < nfcns ? alpha[k] : 0.0; };
+    const int32_t middle = nfcns - 1;
+    if (isOdd && isSymmetric) {
+        for (int32_t j = 0; j < middle; ++j)
+            h[j] = 0.5 * alpha[middle - j];
+        h[middle] = alpha[0];
+    } else {
+        for (int32_t j = 0; j < middle; ++j) {
+            const double neighbour = coefficient(middle - j + distance);
+            h[j] = 0.25 * (alpha[middle - j] + (isSymmetric ? neighbour : -neighbour));
+        }
+        const double neighbour = 0.25 * coefficient(distance);
+        h[middle] = 0.5 * alpha[0] + (isSymmetric ? neighbour : -neighbour);
+        if (isOdd)
+            h[nfcns] = 0.0;
+    }
+    for (int32_t j = 0; j < n / 2; ++j)
+        h[n - 1 - j] = isSymmetric ? h[j] : -h[j];
+}
+
+} // namespace
+
+ErrorCode RemezDesign(int32_t nBands, const DBL *desired, const DBL *weight, double fs,
+                      const DBL *edges, int32_t type, int32_t n, DBL *h, double *ripple,
+                      int32_t maxIterations) {
+    if (n < 3)
+        return ErrBadDesignField;
+    const Bands bands{nBands, desired, weight, edges, fs, type};
+    if (const ErrorCode failed = CheckBands(bands, n))
+        return failed;
+    const bool isOdd = n % 2 != 0;
+    const int32_t nfcns = n / 2 + (isOdd && type == RemezMultiband ? 1 : 0);
+    if (nfcns + 2 >= mostExtrema)
+        return ErrOutOfMemory;
+
+    Grid grid;
+    if (const ErrorCode failed = LayGrid(bands, nfcns, grid))
+        return failed;
+    DivideByFactor(bands, isOdd, nfcns, grid);
+    if (grid.size < 1)
+        return ErrBadDesignField;
+    Exchange exchange(grid, nfcns);
+    if (const ErrorCode failed =
+            exchange.run(maxIterations > 0 ? maxIterations : usualRounds, ripple))
+        return failed;
+
+    const bool isMapped = type == RemezHilbert;
+    Scratch<ElementType::DBL> alpha;
+    if (alpha.allocate(nfcns) != 0)
+        return ErrOutOfMemory;
+    if (const ErrorCode failed = FindCoefficients(exchange, isMapped ? Mapping(grid) : Mapping(),
+                                                  isMapped, nfcns, alpha.data()))
+        return failed;
+    FormTaps(alpha.data(), nfcns, type, n, h);
+    *ripple = exchange.deviation();
+    return 0;
+}
+
+} // namespace qx

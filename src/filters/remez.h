@@ -1,0 +1,50 @@
+#ifndef QX_FILTERS_REMEZ_H
+#define QX_FILTERS_REMEZ_H
+
+#include "frame/elements.h"
+#include "frame/widths.h"
+#include "qx/errors.h"
+
+#include <cstdint>
+
+namespace qx {
+
+// Equiripple FIR filters with linear phase by the exchange of Remez, after J. H. McClellan, T. W.
+// Parks and L. R. Rabiner, "A computer program for designing optimum FIR linear phase digital
+// filters", 1973: the taps whose greatest weighted deviation from what is desired, over all bands,
+// is the least.
+
+enum RemezType : int32_t { RemezMultiband = 1, RemezDifferentiator = 2, RemezHilbert = 3 };
+
+// n taps into h, symmetric for a multiband filter, antisymmetric for the others; the deviation
+// into *ripple. The bands have edges[2 b] and edges[2 b + 1], in the unit of fs, a gain (of a
+// differentiator: a slope in cycles per sample) and a weight (of a differentiator: one that is
+// divided by the frequency). maxIterations not above 0 means 100.
+//
+// ErrBadDesignField: n below 3; a number that is not finite; edges that do not begin or end where
+// the type needs it; or an exchange that loses, has two extrema at one place or does not settle
+// within its rounds, and then *ripple has the last deviation. ErrEmptyInput: no band. ErrBadCutoff:
+// fs or a weight not above 0, a negative edge or gain, edges that do not rise. ErrAboveNyquist.
+// ErrBadTapCount: an even n with a gain at the Nyquist frequency. ErrOutOfMemory: no memory, or
+// about 4090 taps and more, the limit of the design.
+ErrorCode RemezDesign(int32_t nBands, const DBL *desired, const DBL *weight, double fs,
+                      const DBL *edges, int32_t type, int32_t n, DBL *h, double *ripple,
+                      int32_t maxIterations);
+
+// The interpolating polynomial of an exchange: through y[j] at x[j], with ad[j] = 1 / (product of
+// x[j] - x[k] over the other k).
+struct Interpolation {
+    const DBL *x, *y, *ad;
+    int32_t count;
+};
+
+// Points that are evaluated at once.
+constexpr int32_t interpolationGroup = 4;
+
+// Its values at a group of places: the sum over j of c y[j] by the sum of c, c = ad[j] / (place -
+// x[j]), both in this order, the second one compensated. At x[j] itself it is NaN.
+QX_BY_WIDTH(void, Interpolate, (const Interpolation &polynomial, const DBL *places, DBL *values))
+
+} // namespace qx
+
+#endif
