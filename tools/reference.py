@@ -22,21 +22,39 @@ from pathlib import Path
 
 ROOT = Path(__file__).resolve().parent.parent
 sys.path.insert(0, str(ROOT / "python"))
+from qx.report import COMMON_STYLE, HEAD  # noqa: E402
 
 STYLE = """
-body { font: 15px/1.5 "DejaVu Sans", "Segoe UI", Helvetica, Arial, sans-serif; color: #1f2d3d;
-       max-width: 62em; margin: 2em auto; padding: 0 1.2em; }
-h1 { font-size: 1.6em; } h2 { font-size: 1.2em; border-bottom: 1px solid #dfe5ec; margin-top: 2em; }
-h3 { font-size: 1.02em; margin: 2em 0 .3em; } a { color: #2f6db3; text-decoration: none; }
+h1 { font-size: 1.6em; } h2 { font-size: 1.2em; border-bottom: 1px solid var(--line); margin-top: 2em; }
+h3 { font-size: 1.02em; margin: 2em 0 .3em; overflow-wrap: anywhere; } a { color: var(--link);
+     text-decoration: none; }
 code, pre { font-family: "DejaVu Sans Mono", Consolas, monospace; font-size: .86em; }
-pre { background: #f5f7fa; padding: .6em .9em; overflow-x: auto; margin: .4em 0; }
-pre.out { background: #fff; border-left: 3px solid #c9d3df; color: #44546a; }
+pre { background: var(--shade); padding: .6em .9em; overflow-x: auto; margin: .4em 0; }
+pre.out { background: none; border-left: 3px solid var(--line); color: var(--quiet); }
 table { border-collapse: collapse; } td, th { padding: .15em 1.2em .15em 0; text-align: left;
-       vertical-align: top; border-bottom: 1px solid #eef1f5; }
-figure { margin: .6em 0; } figure svg { width: 100%; height: auto; }
-.as { border-left: 3px solid #d5dbe3; padding-left: .9em; }
-ul.index { columns: 3; padding-left: 1.2em; font-size: .92em; }
+       vertical-align: top; border-bottom: 1px solid var(--line); overflow-wrap: anywhere; }
+.as { border-left: 3px solid var(--line); padding-left: .9em; }
+table.index { width: 100%; font-size: .92em; } table.index td:first-child { width: 17em; }
+input { font: inherit; width: 100%; box-sizing: border-box; padding: .4em .6em; color: inherit;
+       background: var(--shade); border: 1px solid var(--line); border-radius: .3em; }
+@media (max-width: 640px) { table.index td { display: block; width: auto; border: 0; }
+  table.index td + td { border-bottom: 1px solid var(--line); } }
 """
+# Shows the rows that have all the words of the box, and the families that still have rows.
+SEARCH = """<script>
+document.getElementById("search").addEventListener("input", function () {
+  const words = this.value.toLowerCase().split(/\\s+/);
+  for (const family of document.querySelectorAll("section")) {
+    let some = false;
+    for (const row of family.querySelectorAll("tr")) {
+      const text = (row.textContent + " " + row.dataset.more).toLowerCase();
+      row.hidden = !words.every(word => text.includes(word));
+      some = some || !row.hidden;
+    }
+    family.hidden = !some;
+  }
+});
+</script>"""
 KINDS = {"array1d": "array of {}", "array2d": "matrix of {}", "array3d": "array of {}, three dimensions", "value": "{}",
          "reference": "{} by reference", "output": "{}", "inout": "{}", "error": "code",
          "record": "record {}", "slot": "plan slot", "instance": "instance data",
@@ -71,8 +89,8 @@ def prose(text):
 
 def page(title, body, up=True):
     back = '<p><a href="index.html">All families</a></p>' if up else ""
-    return ('<!DOCTYPE html>\n<html lang="en"><head><meta charset="utf-8">'
-            f"<title>{html.escape(title)}</title><style>{STYLE}</style></head><body>{back}"
+    return (f'<!DOCTYPE html>\n<html lang="en"><head>{HEAD}'
+            f"<title>{html.escape(title)}</title><style>{COMMON_STYLE}{STYLE}</style></head><body>{back}"
             f"<h1>{html.escape(title)}</h1>{body}</body></html>\n")
 
 
@@ -141,6 +159,19 @@ def examples_text(path):
     return "".join(out)
 
 
+def index_of(entries, prefix=""):
+    """A table of names and summaries; what can be searched beside these is in data-more."""
+    from qx.catalogue import summary
+    rows = []
+    for entry in entries:
+        name = entry["name"]
+        more = html.escape(" ".join([entry["family"], *entry["inherited"],
+                                     *entry["documentation"].split()]), quote=True)
+        rows.append(f'<tr data-more="{more}"><td><a href="{prefix}#{name}">{name}</a></td>'
+                    f"<td>{marked(summary(entry))}</td></tr>")
+    return f'<table class="index">{"".join(rows)}</table>'
+
+
 def write(output):
     from qx.functions import signature_text
     from qx.library import library
@@ -148,16 +179,16 @@ def write(output):
     catalogue = lib.catalogue
     output.mkdir(parents=True, exist_ok=True)
     index = ["<p>Every export of the module, by family. <code>python3 -m qx show NAME</code> tells "
-             "the same on the terminal.</p>"]
+             "the same on the terminal.</p>",
+             '<p><input id="search" type="search" placeholder="Words of a name or a text" autofocus></p>']
     shown = set()
     for family in catalogue["families"]:
         entries = [e for e in catalogue["exports"] if e["family"] == family["name"]]
         if not entries:
             continue
         name = family["name"]
-        links = "".join(f'<li><a href="{name}.html#{e["name"]}">{e["name"]}</a></li>' for e in entries)
         body = [f"<p>Header <code>{family['header']}</code></p>", prose(family["introduction"]),
-                f'<ul class="index">{links}</ul>']
+                index_of(entries)]
         for path in examples_of(name, catalogue):
             shown.add(path.name)
             body.append(examples_text(path))
@@ -165,12 +196,12 @@ def write(output):
         body += [export_text(e, catalogue, lib, signature_text(e)) for e in entries]
         (output / f"{name}.html").write_text(page(name, "".join(body)), "utf-8")
         first = re.split(r"(?<=\.)\s", " ".join(family["introduction"].split()))[0]
-        index.append(f'<h2><a href="{name}.html">{name}</a></h2><p>{marked(first)}</p>'
-                     f'<ul class="index">{links}</ul>')
+        index.append(f'<section><h2><a href="{name}.html">{name}</a></h2><p>{marked(first)}</p>'
+                     f"{index_of(entries, f'{name}.html')}</section>")
     for path in sorted((ROOT / "examples" / "reference").glob("*.py")):
         if path.name not in shown:
             print(f"not shown: {path}, whose first export is not in this build")
-    (output / "index.html").write_text(page("Reference", "".join(index), up=False), "utf-8")
+    (output / "index.html").write_text(page("Reference", "".join([*index, SEARCH]), up=False), "utf-8")
 
 
 def main(arguments=None):

@@ -10,11 +10,14 @@ import html
 import io
 import math
 import os
+import textwrap
+import warnings
 from datetime import datetime, timezone
 
 import numpy as np
 
 from .calls import call
+from .outcomes import QxError
 
 BLUE, DARK, GREY, WARM = "#2f6db3", "#1f2d3d", "#8795a6", "#c8553d"
 
@@ -37,7 +40,20 @@ class Section:
 
 
 def number(value, digits=6):
-    return f"{value:.{digits}g}"
+    return f"{value:.{digits}g}" if math.isfinite(value) else "beyond all numbers"
+
+
+def resolved(values, step):
+    """The values as texts with the digits that a difference of `step` needs."""
+    values = [float(value) for value in values]
+    largest = max(map(abs, values), default=0.0)
+    if not (step > 0 and math.isfinite(step) and math.isfinite(largest)):
+        return [number(value) for value in values]
+    place = math.floor(math.log10(step)) - 1  # of the last digit, one finer than the step
+    if 1e-4 <= max(largest, step) < 1e7:
+        return [f"{value:.{max(0, -place)}f}" for value in values]
+    digits = max(1, math.floor(math.log10(largest)) - place) if largest else 1
+    return [f"{value:.{min(17, digits)}e}" for value in values]
 
 
 def power_unit(unit, exponent):
@@ -69,16 +85,40 @@ def _pyplot():
         "axes.titleweight": "bold", "axes.titlelocation": "left", "axes.spines.top": False,
         "axes.spines.right": False, "axes.grid": True, "grid.color": "#dfe5ec",
         "grid.linewidth": 0.7, "axes.axisbelow": True, "xtick.color": DARK, "ytick.color": DARK,
-        "svg.fonttype": "path", "svg.hashsalt": "qx", "figure.constrained_layout.use": True})
+        "axes.formatter.useoffset": False, "text.parse_math": False, "savefig.transparent": True,
+        # Texts stay texts: the reader's fonts have what ours lacks.
+        "svg.fonttype": "none", "figure.constrained_layout.use": True})
     return plt
 
 
 def _svg(plt, figure):
-    buffer = io.StringIO()
-    figure.savefig(buffer, format="svg", metadata={"Date": None})
+    """The figure for a page: as it is, and redrawn for windows as narrow as a telephone."""
+    drawings = [_drawn(plt, figure, "wide")]
+    width, height = figure.get_size_inches()
+    if width > 6:
+        figure.set_size_inches(NARROW, max(2.6, 0.85 * height))
+        for axes in figure.axes:
+            axes.set_title(textwrap.fill(axes.get_title("left"), 46), loc="left")
+            longest = max((len(label.get_text()) for label in axes.get_xticklabels()), default=0)
+            if longest > 5 and axes.get_xscale() == "linear":
+                axes.locator_params(axis="x", nbins=max(2, 40 // (longest + 2)))
+        drawings.append(_drawn(plt, figure, "narrow"))
     plt.close(figure)
+    return "".join(drawings)
+
+
+NARROW = 4.6  # inches
+
+
+def _drawn(plt, figure, kind):
+    buffer = io.StringIO()
+    # Names in the drawing are made from its content; the two of a figure are never shown together.
+    plt.rcParams["svg.hashsalt"] = kind
+    with warnings.catch_warnings():
+        warnings.filterwarnings("ignore", message="Glyph .* missing from current font")
+        figure.savefig(buffer, format="svg", metadata={"Date": None})
     text = buffer.getvalue()
-    return text[text.index("<svg"):]
+    return text[text.index("<svg"):].replace("<svg ", f'<svg class="{kind}" ', 1)
 
 
 def _trace(axes, x, y, **style):
@@ -140,16 +180,18 @@ def statistics(recording):
     moments = {order: call("Moment_head", x, order) for order in (2, 3, 4)}
     bins = bins_for(len(x))
     modes = call("ModeH", x, bins)
-    rows = [Row("Mean", number(mean), unit, "Mean_head"),
-            Row("Root mean square", number(call("RMS_head", x)), unit, "RMS_head"),
-            Row("Median", number(call("Median_head", x)), unit, "Median_head"),
-            Row(f"Mode, fullest of {bins} bins", ", ".join(map(number, modes[:4])) or "none", unit,
-                "ModeH")]
+    shown = [mean, call("RMS_head", x), call("Median_head", x), *modes[:4]]
+    # Digits for a thousandth of the range, and no less than six.
+    mean_, rms, median, *modes = (max(pair, key=len) for pair in zip(
+        map(number, shown), resolved(shown, 1e-3 * float(np.ptp(x)))))
+    rows = [Row("Mean", mean_, unit, "Mean_head"), Row("Root mean square", rms, unit, "RMS_head"),
+            Row("Median", median, unit, "Median_head"),
+            Row(f"Mode, fullest of {bins} bins", ", ".join(modes) or "none", unit, "ModeH")]
     rows += [Row(f"Central moment of order {order}", number(moment), power_unit(unit, order),
                  "Moment_head") for order, moment in moments.items()]
     deviation = math.sqrt(moments[2])
     rows.append(Row("Standard deviation", number(deviation), unit, "√ moment 2"))
-    if deviation > 0 and math.isfinite(moments[4]):
+    if 1e-77 < deviation < 1e77:  # whose fourth power is a number
         rows.append(Row("Skewness", number(moments[3] / deviation**3), "",
                         "moment 3 / deviation³"))
         rows.append(Row("Kurtosis", number(moments[4] / deviation**4), "",
@@ -167,7 +209,7 @@ def histogram(recording):
     figure, axes = plt.subplots(figsize=(10, 3.1))
     axes.bar(centres, counts, width=0.92 * width, color=BLUE)
     for value, name, colour in ((mean, "mean", WARM), (median, "median", DARK)):
-        axes.axvline(value, color=colour, linewidth=1.3, label=f"{name} {number(value, 4)}",
+        axes.axvline(value, color=colour, linewidth=1.3, label=f"{name} {resolved([value], width)[0]}",
                      linestyle="-" if name == "mean" else "--")
     axes.legend(frameon=False)
     axes.set(title=f"Histogram, {len(counts)} bins of width {number(width, 3)} {recording.unit}",
@@ -175,8 +217,10 @@ def histogram(recording):
     axes.grid(axis="x", visible=False)
     coarse, coarse_centres = call("histgran_head", x, 12)
     longest = max(1, coarse.max())
-    bars = [f"{number(centre, 4):>11} {recording.unit}  {'#' * round(40 * count / longest):<40} {count}"
-            for centre, count in zip(coarse_centres, coarse)]
+    labels = resolved(coarse_centres, coarse_centres[1] - coarse_centres[0])
+    wide = max(11, *map(len, labels))
+    bars = [f"{label:>{wide}} {recording.unit}  {'#' * round(40 * count / longest):<40} {count}"
+            for label, count in zip(labels, coarse)]
     return Section("Histogram", "Equal bins over the range of the data (histgran_head).",
                    figures=[_svg(plt, figure)], terminal=["Histogram (bin centre, samples)", *bars])
 
@@ -215,8 +259,9 @@ def amplitudes(recording):
     frequencies, values = amplitude_spectrum(recording)
     shown, frequencies = values[1:], scale * frequencies[1:]
     unit = "Hz" if recording.rate else "per sample"
-    rows = [Row(f"At {number(frequencies[i], 4)} {unit}", number(shown[i], 4), recording.unit,
-                "ReOXFFTH80") for i in strongest(frequencies, shown, 5, 0.01 * frequencies[-1])]
+    found = strongest(frequencies, shown, 5, 0.01 * frequencies[-1])
+    rows = [Row(f"At {label} {unit}", number(shown[i], 4), recording.unit, "ReOXFFTH80")
+            for i, label in zip(found, resolved(frequencies[found], frequencies[0]))]
     plt = _pyplot()
     figure, axes = plt.subplots(figsize=(10, 3.1))
     _trace(axes, frequencies, np.maximum(shown, 1e-300), color=BLUE, linewidth=0.6)
@@ -265,6 +310,12 @@ def power(recording):
     scale, label = frequency_axis(recording)
     length = 2 ** min(16, max(3, int(math.log2(n / 8))))
     x = recording.values - call("Mean_head", recording.values)
+    largest = float(np.abs(x).max())
+    if not 1e-140 < largest < 1e140:
+        what = (f"The squares of values around {largest:.2g} leave the range of numbers, so there is no "
+                "power spectrum." if largest else "The recording is constant: it has no power beside its "
+                "mean.")
+        return Section("Averaged power spectrum", what)
     frequencies, density, segments = averaged_spectrum(x, length)
     frequencies, density = scale * frequencies, density / scale
     unit = f"{power_unit(recording.unit, 2) or '1'}/{'Hz' if recording.rate else 'cycle per sample'}"
@@ -282,7 +333,7 @@ def power(recording):
                 "SpectrumH, AllWinH"),
             Row("Variance, for comparison", number(call("Moment_head", recording.values, 2)),
                 power_unit(recording.unit, 2), "Moment_head"),
-            Row("Strongest above 0 at", number(frequencies[1 + np.argmax(density[1:])], 4),
+            Row("Strongest above 0 at", resolved([frequencies[1 + np.argmax(density[1:])]], step)[0],
                 "Hz" if recording.rate else "cycles per sample", "SpectrumH, AllWinH")]
     return Section("Averaged power spectrum",
                    f"{segments} half-overlapped segments of {length} samples, without the mean, "
@@ -298,25 +349,41 @@ SECTIONS = [overview, statistics, histogram, amplitudes, power, filtered]
 
 # Output
 
-STYLE = """
-body { font: 15px/1.5 "DejaVu Sans", "Segoe UI", Helvetica, Arial, sans-serif; color: #1f2d3d;
-       max-width: 62em; margin: 2em auto; padding: 0 1.2em; background: #fff; }
-h1 { font-size: 1.6em; margin-bottom: .1em; } h2 { font-size: 1.15em; margin: 1.8em 0 .4em;
-     border-bottom: 1px solid #dfe5ec; padding-bottom: .2em; }
-p.source { color: #5b6b7d; margin-top: 0; } figure { margin: 0 0 .6em; }
-figure svg { width: 100%; height: auto; }
+# For all pages: plots in the size of the window, and dark where the reader prefers it. The drawings
+# have no ground of their own, so turning their colours round does it for them.
+COMMON_STYLE = """
+:root { color-scheme: light dark; --text: #1f2d3d; --ground: #fff; --quiet: #5b6b7d; --line: #dfe5ec;
+        --shade: #f5f7fa; --link: #2f6db3; }
+body { font: 15px/1.5 "DejaVu Sans", "Segoe UI", Helvetica, Arial, sans-serif; color: var(--text);
+       max-width: 62em; margin: 2em auto; padding: 0 1.2em; background: var(--ground); }
+figure { margin: 0 0 .6em; } figure svg { width: 100%; height: auto; } figure svg.narrow { display: none; }
+@media (max-width: 640px) { body { margin: 1em auto; padding: 0 .8em; }
+  figure svg.wide:not(:only-child) { display: none; } figure svg.narrow { display: block; } }
+@media (prefers-color-scheme: dark) {
+  :root { --text: #dde4ec; --ground: #15191e; --quiet: #93a1b1; --line: #303a45; --shade: #1d232a;
+          --link: #7db2ea; }
+  figure svg { filter: invert(1) hue-rotate(180deg); } }
+@media print { figure svg.narrow { display: none; } }
+"""
+HEAD = ('<meta charset="utf-8"><meta name="viewport" content="width=device-width, initial-scale=1">')
+
+STYLE = COMMON_STYLE + """
+h1 { font-size: 1.6em; margin-bottom: .1em; overflow-wrap: anywhere; } h2 { font-size: 1.15em;
+     margin: 1.8em 0 .4em; border-bottom: 1px solid var(--line); padding-bottom: .2em; }
+p.source { color: var(--quiet); margin: .2em 0; overflow-wrap: anywhere; }
 table { border-collapse: collapse; } td, th { padding: .22em 1.4em .22em 0; text-align: left;
-     border-bottom: 1px solid #eef1f5; } td.value { text-align: right; white-space: nowrap;
-     font-variant-numeric: tabular-nums; padding-right: .5em; } td.export { color: #5b6b7d;
-     font-family: "DejaVu Sans Mono", Consolas, monospace; font-size: .86em; }
-table + figure { margin-top: 1em; } footer { margin-top: 3em; color: #8795a6; font-size: .85em; }
+     border-bottom: 1px solid var(--line); } td.value { text-align: right; white-space: nowrap;
+     font-variant-numeric: tabular-nums; padding-right: .5em; } td.export { color: var(--quiet);
+     font-family: "DejaVu Sans Mono", Consolas, monospace; font-size: .86em; overflow-wrap: anywhere; }
+table + figure { margin-top: 1em; } footer { margin-top: 3em; color: var(--quiet); font-size: .85em; }
+@media (max-width: 640px) { td, th { padding-right: .6em; } td.export { font-size: .7em; } }
 """
 
 
 def page(recording, sections):
     escape = html.escape
     title = recording.name
-    out = ["<!DOCTYPE html>", '<html lang="en"><head><meta charset="utf-8">',
+    out = ["<!DOCTYPE html>", f'<html lang="en"><head>{HEAD}',
            f"<title>{escape(title)}</title><style>{STYLE}</style></head><body>",
            f"<h1>{escape(title)}</h1>"]
     if recording.choice:
@@ -351,9 +418,22 @@ def lines(recording, sections):
         yield from (f"  {line}" for line in section.terminal)
 
 
+def sections_of(recording):
+    found = []
+    for make in SECTIONS:
+        try:
+            section = make(recording)
+        except QxError as error:
+            section = Section(make.__name__.replace("_", " ").capitalize(),
+                              f"Not possible for this recording: {error}.")
+        if section:
+            found.append(section)
+    return found
+
+
 def write(recording, path):
     """Writes the page and gives the lines for the terminal."""
-    sections = [section for section in (make(recording) for make in SECTIONS) if section]
+    sections = sections_of(recording)
     folder = os.path.dirname(path)
     if folder:
         os.makedirs(folder, exist_ok=True)
