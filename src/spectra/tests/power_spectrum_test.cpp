@@ -109,25 +109,6 @@ TEST(Spectra, CrossByDefinitionWithExactZerosAndConjugates) {
     }
 }
 
-// Every value is formed from the half-complex spectrum in one order of arithmetic.
-TEST(Spectra, ThePowerIsThatOfTheHalfComplexSpectrumToTheBit) {
-    for (int32_t n : {2, 3, 6, 13, 35, 50}) {
-        SCOPED_TRACE(n);
-        const DBLArray x(RandomSignal(n));
-        DBLArray h;
-        Node node;
-        ASSERT_EQ(ReOXFFTHCH(x.handle(), h.handle(), &node.slot), 0);
-        ASSERT_EQ(SpectrumH(x.handle(), &node.slot), 0);
-        const double s = 1.0 / (double{1} * n * n);
-        EXPECT_EQ(x[0], h[0] * h[0] * s);
-        for (int32_t k = 1; k <= (n - 1) / 2; ++k)
-            EXPECT_EQ(x[k], (h[k] * h[k] + h[n - k] * h[n - k]) * s);
-        if (n % 2 == 0) {
-            EXPECT_EQ(x[n / 2], s * (h[n / 2] * h[n / 2]));
-        }
-    }
-}
-
 TEST(Spectra, OneValueAndNoNumber) {
     Node node;
     const DBLArray x{-3.0};
