@@ -53,7 +53,7 @@ TEST(SpecialGamma, CompleteBetaOfLargeNegativeArguments) {
         {-3.3, 1000.7, 3466623073.218291045},        {-51.25, 0.75, -0.09030933984921073535},
     };
     for (const auto &p : points) {
-        EXPECT_NEAR(Value("BetaComplete", p.a, p.b) / p.value, 1.0, 2e-12) << p.a << ' ' << p.b;
+        EXPECT_NEAR(Value("BetaComplete", p.a, p.b) / p.value, 1.0, 2.7e-15) << p.a << ' ' << p.b;
         EXPECT_EQ(Value("BetaComplete", p.a, p.b), Value("BetaComplete", p.b, p.a));
     }
     EXPECT_EQ(Value("BetaComplete", -60.5, 30.5), 0) << "a pole of gamma(a + b)";
