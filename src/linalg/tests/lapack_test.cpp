@@ -8,7 +8,6 @@
 
 #include <cmath>
 #include <complex>
-#include <limits>
 #include <memory>
 #include <thread>
 #include <vector>
@@ -33,7 +32,6 @@ std::vector<double> Reals(std::size_t count, uint64_t seed) {
 }
 
 Exact Of(CDB z) { return {z.re, z.im}; }
-Exact Of(double x) { return {x, 0}; }
 
 // The largest difference from the definition, summed downward in long double, over the largest sum
 // of moduli.
@@ -55,26 +53,6 @@ double ErrorOfProduct(const std::vector<T> &a, const std::vector<T> &b, const st
     return static_cast<double>(error / scale);
 }
 
-const int shapes[][3] = {{1, 1, 1},    {2, 3, 4},    {8, 8, 8},     {9, 8, 8},
-                         {5, 1, 7},    {1, 40, 1},   {13, 17, 11},  {64, 64, 64},
-                         {3, 130, 70}, {130, 65, 3}, {1540, 300, 3}};
-
-TEST(Products, AgreeWithTheDefinitionInEveryShape) {
-    for (const auto &[m, k, n] : shapes) {
-        SCOPED_TRACE(testing::Message() << m << " " << k << " " << n);
-        for (const int alignedCopy : {0, 1}) {
-            const auto a = Reals(m * k, 1), b = Reals(k * n, 2);
-            std::vector<double> c(m * n, 7.0);
-            ASSERT_EQ(qx::MatrixProduct(a.data(), b.data(), m, k, n, c.data(), alignedCopy), 0);
-            EXPECT_LT(ErrorOfProduct(a, b, c, m, k, n), 4e-16);
-            const auto za = Elements(m * k, 1), zb = Elements(k * n, 2);
-            std::vector<CDB> zc(m * n, CDB{7.0, 7.0});
-            ASSERT_EQ(qx::MatrixProduct(za.data(), zb.data(), m, k, n, zc.data(), alignedCopy), 0);
-            EXPECT_LT(ErrorOfProduct(za, zb, zc, m, k, n), 8e-16);
-        }
-    }
-}
-
 TEST(Products, TransposesAndConjugates) {
     const int m = 37, n = 21;
     auto a = Elements(m * n, 1);
@@ -89,17 +67,6 @@ TEST(Products, TransposesAndConjugates) {
     EXPECT_LT(ErrorOfProduct(a, t, product, m, n, m), 8e-16);
     qx::TransposeMatrix(t.data(), n, m, nullptr); // in place
     EXPECT_EQ(t[5 * n + 3].im, -a[5 * n + 3].im);
-}
-
-TEST(Products, OfSmallMatricesAreSummedInAscendingOrder) {
-    // 1e16 swallows a 1 that comes after it, but not one that comes after its own negative.
-    const double a[] = {1e16, 1, -1e16, 1};
-    const double ones[] = {1, 1, 1, 1};
-    double c;
-    qx::MatrixProductPlain(a, ones, 1, 4, 1, &c);
-    EXPECT_EQ(c, 1.0);
-    qx::MatrixVectorProduct(a, 1, 4, ones, &c);
-    EXPECT_EQ(c, 1.0);
 }
 
 TEST(Lapack, BandAndTridiagonalDriversSolve) {
