@@ -1,23 +1,57 @@
 """The command report."""
 
+import argparse
 import os
+import sys
 
 from .values import positive
 
 
 def report_on(options):
+    from .. import many
+    reading = {"rate": options.rate, "column": options.column, "decimal": options.decimal,
+               "missing": options.missing, "start": options.start}
+    if many.is_many(options.files):
+        return report_on_many(options, reading)
     from .. import recording, report
-    read = recording.read(options.file, options.rate, options.column, options.decimal, options.missing,
-                          options.start)
     path = os.path.join(options.output, "report.html")
-    for line in report.write(read, path):
+    for line in report.write(recording.read(options.files[0], **reading), path):
         print(line)
     print(f"\nThe report with plots: {path}")
 
 
+def report_on_many(options, reading):
+    import tqdm
+
+    from .. import many
+    bar = tqdm.tqdm(unit=" recordings", disable=not sys.stderr.isatty())
+
+    def tell(outcome):
+        if outcome.failure:
+            bar.write(f"qx: {outcome.failure}", file=sys.stderr)
+        bar.update()
+
+    with bar:
+        found = many.write([os.fspath(path) for path in options.files], options.output, reading,
+                           options.workers, options.scheduler, tell, bar.reset)
+    read = sum(not outcome.failure for outcome in found)
+    print(f"{read} of {len(found)} recordings were read: {os.path.join(options.output, 'index.html')}")
+    if not read:
+        raise many.InputError("no recording could be read")
+
+
+def count(text):
+    value = int(text)
+    if value < 1:
+        raise argparse.ArgumentTypeError(f"{text} is not above 0")
+    return value
+
+
 def add(commands):
-    command = commands.add_parser("report", help="analyses a recording, a text table or an audio file")
-    command.add_argument("file")
+    command = commands.add_parser("report", help="analyses recordings, text tables or audio files",
+                                  description="Analyses a recording, or many: each has a page then, and "
+                                  "an index leads to them.")
+    command.add_argument("files", nargs="+", metavar="FILE|FOLDER|PATTERN")
     command.add_argument("--rate", type=positive, metavar="HZ", help="samples per second")
     command.add_argument("--column", metavar="NAME", help="column or channel, a name or a number")
     command.add_argument("--decimal", choices=("point", "comma"), help="of the numbers in a table")
@@ -26,5 +60,10 @@ def add(commands):
     command.add_argument("--start", type=int, default=0, metavar="SAMPLES",
                          help="samples to leave out at the start")
     command.add_argument("--output", default="out", metavar="FOLDER",
-                         help="where report.html goes, out by default")
+                         help="where the pages go, out by default")
+    command.add_argument("--workers", type=count, metavar="N",
+                         help="processes for many recordings; as many as processors by default")
+    command.add_argument("--scheduler", metavar="ADDRESS",
+                         help="of a Dask cluster that is given many recordings; its workers have this "
+                         "package and reach the files by the same paths")
     command.set_defaults(run=report_on)

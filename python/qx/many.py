@@ -1,0 +1,149 @@
+"""Reports on many recordings: a page for each and an index with the main figures. The work goes to
+processes of this machine, or to the workers of a Dask scheduler, and a recording that cannot be read
+costs its own line and nothing else."""
+
+import concurrent.futures
+import dataclasses
+import glob
+import html
+import multiprocessing
+import os
+from pathlib import Path
+
+from .audio import ENDINGS as AUDIO
+from .tables import InputError
+
+TABLES = (".csv", ".txt", ".tsv", ".tab", ".dat", ".asc", ".prn")
+MAIN = ("Mean", "Root mean square", "Standard deviation", "Strongest above 0 at")
+
+
+@dataclasses.dataclass
+class Outcome:
+    """What becomes of one recording: a page with figures, or the reason why there is none."""
+
+    name: str
+    page: str = ""
+    cells: tuple = ()  # of the table in the index
+    failure: str = ""
+
+
+def is_many(paths):
+    return len(paths) > 1 or os.path.isdir(paths[0]) or is_pattern(paths[0])
+
+
+def is_pattern(path):
+    return not os.path.exists(path) and glob.has_magic(path)
+
+
+def files_of(paths):
+    """Pairs of a name and a path: what folders hold, patterns match, or is named itself."""
+    found = {}
+    for given in paths:
+        if os.path.isdir(given):
+            inside = [path for path in Path(given).rglob("*") if path.is_file()
+                      and path.suffix.lower() in (*TABLES, *AUDIO)]
+            found |= {str(path): path.relative_to(given) for path in inside}
+        elif is_pattern(given):
+            found |= {path: Path(path) for path in glob.glob(given, recursive=True) if os.path.isfile(path)}
+        else:
+            found[given] = Path(given)
+    named = {path: "_".join(part for part in name.parts if part not in ("/", ".."))
+             for path, name in found.items()}
+    pairs, seen = [], {}
+    for path, name in sorted(named.items(), key=lambda pair: (pair[1], pair[0])):
+        seen[name] = seen.get(name, 0) + 1
+        pairs.append((name if seen[name] == 1 else f"{name} ({seen[name]})", path))
+    return pairs
+
+
+def report_on(name, path, options):
+    """The outcome of one recording; runs in a worker."""
+    try:
+        from . import recording, report
+        read = recording.read(path, **options)
+        sections = report.sections_of(read)
+        rows = {row.label: f"{row.value} {row.unit}".strip() for section in sections for row in section.rows}
+        rate = f"{read.rate:.6g}" if read.rate else ""
+        return Outcome(name, report.page(read, sections),
+                       (str(len(read.values)), rate, *(rows.get(label, "") for label in MAIN)))
+    except InputError as error:
+        return Outcome(name, failure=str(error))
+    except Exception as error:  # whatever it is, the others go on
+        return Outcome(name, failure=f"{path}: {type(error).__name__}: {error}")
+
+
+def _local(workers):
+    return concurrent.futures.ProcessPoolExecutor(workers, multiprocessing.get_context("spawn"))
+
+
+def outcomes(pairs, options, workers=None, scheduler=None):
+    """The outcomes in the order in which they are ready."""
+    if scheduler:
+        import distributed
+        with distributed.Client(scheduler) as client, client.get_executor(pure=False) as executor:
+            yield from _finished(executor, pairs, options, [])
+        return
+    left = []
+    with _local(workers) as executor:
+        yield from _finished(executor, pairs, options, left)
+    for pair in left:  # a process that died took the others along: these have one each
+        with _local(1) as executor:
+            died = []
+            yield from _finished(executor, [pair], options, died)
+        for name, path in died:
+            yield Outcome(name, failure=f"{path}: its process died, perhaps for want of memory")
+
+
+def _finished(executor, pairs, options, left):
+    waiting = {executor.submit(report_on, name, path, options): (name, path) for name, path in pairs}
+    for future in concurrent.futures.as_completed(list(waiting)):
+        pair = waiting.pop(future)
+        try:
+            yield future.result()
+        except concurrent.futures.BrokenExecutor:
+            left.append(pair)
+
+
+def index(found):
+    """The page that leads to the others."""
+    from .report import HEAD, STYLE
+    escape = html.escape
+    header = "".join(f"<th>{label}</th>" for label in ("Recording", "Samples", "Per second", *MAIN))
+    rows = "".join(
+        f'<tr><td><a href="{escape(_link(outcome.name), quote=True)}">{escape(outcome.name)}</a></td>'
+        + "".join(f'<td class="value">{escape(cell)}</td>' for cell in outcome.cells) + "</tr>\n"
+        for outcome in found if not outcome.failure)
+    failed = "".join(f"<li>{escape(outcome.failure)}</li>\n" for outcome in found if outcome.failure)
+    read = sum(not outcome.failure for outcome in found)
+    return (f'<!DOCTYPE html>\n<html lang="en"><head>{HEAD}<title>Recordings</title><style>{STYLE}'
+            "div.wide { overflow-x: auto; }</style></head><body><h1>Recordings</h1>"
+            f"<p>{read} of {len(found)} recordings were read.</p>"
+            f'<div class="wide"><table><tr>{header}</tr>\n{rows}</table></div>'
+            + (f"<h2>Not read</h2><ul>{failed}</ul>" if failed else "") + "</body></html>\n")
+
+
+def _link(name):
+    from urllib.parse import quote
+    return quote(f"{name}.html")
+
+
+def write(paths, folder, options, workers=None, scheduler=None, tell=lambda outcome: None, start=None):
+    """Writes the pages and the index; `start` is told how many there are, `tell` each outcome. Gives
+    the outcomes in the order of their names."""
+    pairs = files_of(paths)
+    if not pairs:
+        raise InputError(f"{', '.join(paths)}: holds no text table and no audio file")
+    if start:
+        start(len(pairs))
+    os.makedirs(folder, exist_ok=True)
+    found = []
+    for outcome in outcomes(pairs, options, workers, scheduler):
+        if not outcome.failure:
+            Path(folder, f"{outcome.name}.html").write_text(outcome.page, "utf-8")
+            outcome.page = ""
+        found.append(outcome)
+        tell(outcome)
+    order = {name: i for i, (name, _) in enumerate(pairs)}
+    found.sort(key=lambda outcome: order[outcome.name])
+    Path(folder, "index.html").write_text(index(found), "utf-8")
+    return found
