@@ -2,21 +2,19 @@
 
 namespace qx {
 
-ErrorCode SettleWeights(int32_t n, int32_t fewest, const DBL **w) {
+ErrorCode SettleWeights(int32_t n, int32_t fewest, const DBL **settled) {
+    const DBL *const w = *settled;
     if (n < fewest)
         return fewest == 2 ? ErrFewerThanTwo : ErrFewerThanThree;
-    if (*w == nullptr)
+    if (w == nullptr)
         return 0;
-    int32_t used = 0;
-    for (int32_t i = 0; i < n; ++i) {
-        const double weight = (*w)[i];
-        if (weight != weight)
-            return ErrNonFiniteInput;
-        used += weight != 0.0;
-    }
-    if (used == 0)
-        *w = nullptr;
-    else if (used < fewest)
+    WeightCounts counts;
+    CountWeights(w, n, &counts);
+    if (counts.broken != 0.0)
+        return ErrNonFiniteInput;
+    if (counts.used == 0.0)
+        *settled = nullptr;
+    else if (counts.used < fewest)
         return ErrTooFewWeights;
     return 0;
 }

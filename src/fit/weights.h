@@ -1,6 +1,7 @@
 #ifndef QX_FIT_WEIGHTS_H
 #define QX_FIT_WEIGHTS_H
 
+#include "frame/widths.h"
 #include "qx/errors.h"
 #include "qx/types.h"
 
@@ -16,6 +17,14 @@ ErrorCode SettleWeights(int32_t n, int32_t fewest, const DBL **w);
 
 // Standard deviations as weights: 1 / sd^2, and 1 for a standard deviation of 0.
 void WeightsOfDeviations(const DBL *deviations, int32_t n, DBL *w);
+
+// How many weights are not 0, and how many are NaN.
+struct WeightCounts {
+    double used, broken;
+};
+QX_BY_WIDTH(void, CountWeights, (const DBL *w, int32_t n, WeightCounts *counts))
+// The largest |w|; none of them is NaN.
+QX_BY_WIDTH(double, LargestWeight, (const DBL *w, int32_t n))
 
 } // namespace qx
 

@@ -1,9 +1,6 @@
 """The linear part of docs/accuracy/fitting.md, from the built module and nist_linear.dat.
 
     QX_LIBRARY_DIR=build/release PYTHONPATH=python make_fitting.py
-
-A number of digits is -log10 of the largest relative error of the coefficients, of their standard
-deviations (from the covariance and the MSE) or of the sum of squared residuals, at most 15.
 """
 
 import math
@@ -48,30 +45,24 @@ def fit(kind, k, y, x, algorithm):
         return c, np.sqrt(np.diag(covariance) * scale), mse * len(y)
 
 
-def cell(values):
-    return " / ".join(values)
-
-
 def main():
     used = [(i, name) for i, name in enumerate(METHODS) if name]
-    print("| Set | terms | " + " | ".join(name for _, name in used) + " | LAPACK |")
+    print("| Set | Terms | " + " | ".join(name for _, name in used) + " | LAPACK |")
     print("|---|---|" + "---|" * (len(used) + 1))
     for name, kind, exact, deviations, squares, y, x in sets():
         k = len(exact)
         cells = []
         for algorithm, _ in used:
             found = fit(kind, k, y, x, algorithm)
-            cells.append("fails" if found is None else
-                         cell([digits(found[0], exact), digits(found[1], deviations),
-                               digits(found[2], squares)]))
+            pairs = zip(found, (exact, deviations, squares)) if found else ()
+            cells.append(" / ".join(digits(*pair) for pair in pairs) or "refused")
         matrix = np.vander(x[:, 0], k, increasing=True) if kind == "polynomial" else x
-        peer = np.linalg.lstsq(matrix, y, rcond=0)[0]
-        cells.append(digits(peer, exact))
+        cells.append(digits(np.linalg.lstsq(matrix, y, rcond=0)[0], exact))
         print(f"| {name} | {k} | " + " | ".join(cells) + " |")
-    print()
-    name, _, exact, _, squares, y, x = next(sets())
+    _, _, exact, _, squares, y, x = next(sets())
     slope, intercept, mse = qx.call("LinFit_head", y, x[:, 0], [])[1:]
-    print("LinFit_head on Norris:", digits([intercept, slope], exact), digits(mse * len(y), squares))
+    print(f"\n`LinFit_head` on Norris: {digits([intercept, slope], exact)} digits of the "
+          f"coefficients, {digits(mse * len(y), squares)} of the sum of squares.")
 
 
 if __name__ == "__main__":

@@ -1,0 +1,1 @@
+qx_bench(fit_lines SOURCES fit_lines.cpp)

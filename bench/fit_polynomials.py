@@ -1,0 +1,52 @@
+"""Polynomial fits against numpy.polyfit, in one process.
+
+Ours is the export, called through ctypes with its arrays at hand, by singular values; it gives the
+values of the fit and the MSE as well, theirs the coefficients alone, by singular values, on one
+thread. Each line has the time of ours and the ratio ours/theirs.
+"""
+
+import ctypes
+import os
+import sys
+
+os.environ["OPENBLAS_NUM_THREADS"] = "1"
+
+import numpy as np  # noqa: E402
+
+from pocketfft import DBL, block_of, load  # noqa: E402
+from pocketfft import seconds  # noqa: E402
+from summary import print_summary  # noqa: E402
+
+
+def ratio(ours, theirs, n):
+    repeats = max(1, 20_000 // n)
+    rounds = [(seconds(ours, repeats), seconds(theirs, repeats)) for _ in range(15)]
+    return [min(column) for column in zip(*rounds)]
+
+
+def main():
+    host, module = load()
+    module.PolyFit_head.argtypes = ([ctypes.c_void_p] * 2 + [ctypes.c_int32] * 2
+                                    + [ctypes.c_void_p] * 3)
+    ratios = []
+    for n in (20, 100, 1000, 10000, 100000, 1000000):
+        noise = np.random.default_rng(n)
+        x = np.linspace(-1, 1, n)
+        y = noise.normal(size=n)
+        handles = [block_of(host, DBL, values) for values in (x, y)]
+        results = [block_of(host, DBL, np.zeros(1)) for _ in range(2)]
+        mse = ctypes.c_double()
+        for order in (1, 3, 6, 12):
+            call = lambda: module.PolyFit_head(  # noqa: E731
+                *handles, order, 0, *results, ctypes.byref(mse))
+            if call() != 0:
+                sys.exit("the fit failed")
+            mine, other = ratio(call, lambda: np.polyfit(x, y, order), n)
+            name = f"n {n}, order {order}"
+            print(f"{name:<20} {1e6 * mine:10.1f} us  polyfit {mine / other:5.2f}", flush=True)
+            ratios.append((mine / other, name))
+    print_summary("polynomial fits, called from Python", "NumPy", ratios)
+
+
+if __name__ == "__main__":
+    main()
