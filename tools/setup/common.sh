@@ -2,6 +2,7 @@
 # Shared by the set-up scripts; sourced, not run. Defines CACHE and:
 #   note TEXT...                a line of progress, on standard error
 #   fail TEXT...                says what is wrong and ends the script
+#   watched LABEL LOG COMMAND...   runs a command with its output in LOG, and tells how far it is
 #   need_commands "PACKAGE..." COMMAND...   installs the packages where a command is missing
 #   debian_source PACKAGE       prints the folder of the unpacked Debian source package
 
@@ -12,6 +13,37 @@ note() { echo "[$(basename "$0")] $*" >&2; }
 fail() {
     note "$*"
     exit 1
+}
+
+# On a terminal a line that goes on changing, else a line now and then. How far a build is stands at
+# the end of its log as [12/345].
+watched() {
+    local label=$1 log=$2 start=$SECONDS told=$SECONDS status=0 far pid
+    shift 2
+    "$@" >"$log" 2>&1 &
+    pid=$!
+    while kill -0 "$pid" 2>/dev/null; do
+        sleep 0.5
+        far=$(tail -c 4096 "$log" | grep -aoE '^\[([0-9]+/[0-9]+\]|(libm|lapack|openblas)\].{1,50})' |
+            tail -n 1)
+        if [ -t 2 ]; then
+            printf '\r%s: %d s %-60s' "$label" $((SECONDS - start)) "$far" >&2
+        elif [ $((SECONDS - told)) -ge 30 ]; then
+            note "$label: $((SECONDS - start)) s $far"
+            told=$SECONDS
+        fi
+    done
+    wait "$pid" || status=$?
+    if [ -t 2 ] && [ $((SECONDS - start)) -gt 0 ]; then
+        printf '\r%s: done in %d s%60s\n' "$label" $((SECONDS - start)) '' >&2
+    fi
+    return "$status"
+}
+
+# Without a prompt, and with fresh lists.
+apt_install() {
+    DEBIAN_FRONTEND=noninteractive apt-get update -qq &&
+        DEBIAN_FRONTEND=noninteractive apt-get install -y --no-install-recommends "$@"
 }
 
 # One set-up script at a time works in the cache: two builds may be configured at once.
@@ -27,12 +59,9 @@ need_commands() {
         command -v "$command" >/dev/null || missing="$missing $command"
     done
     [ -n "$missing" ] || return 0
-    [ "$(id -u)" = 0 ] || fail "missing:$missing. As root: apt-get install $packages"
-    note "installing $packages"
+    [ "$(id -u)" = 0 ] || fail "missing:$missing. As root: apt-get update && apt-get install $packages"
     # shellcheck disable=SC2086
-    { DEBIAN_FRONTEND=noninteractive apt-get update -qq &&
-        DEBIAN_FRONTEND=noninteractive apt-get install -y --no-install-recommends $packages; } \
-        >"$CACHE/apt-install.log" 2>&1 || fail "apt-get install $packages failed: $CACHE/apt-install.log"
+    watched "installing $packages" "$CACHE/apt-install.log" apt_install $packages || fail "apt-get install $packages failed: $CACHE/apt-install.log"
 }
 
 # The machine's own Debian sources as source-package lines, Signed-By included, in a folder of
@@ -67,7 +96,8 @@ debian_source() {
         work=$(mktemp -d "$CACHE/src-XXXXXX")
         (cd "$work" && apt-get "${options[@]}" update && apt-get "${options[@]}" source "$package") \
             >"$CACHE/source-$package.log" 2>&1 ||
-            { rm -rf "$work"; fail "cannot fetch the source package $package: $CACHE/source-$package.log"; }
+            { rm -rf "$work"; fail "Debian's source package $package is needed and cannot be fetched (no" \
+                "network?): see $CACHE/source-$package.log, or copy $CACHE/src from another machine"; }
         unpacked=$(find "$work" -mindepth 1 -maxdepth 1 -type d | head -n 1)
         [ -n "$unpacked" ] || fail "the source package $package holds no folder"
         dpkg-parsechangelog -l "$unpacked/debian/changelog" -S Version >"$unpacked/.version"
