@@ -34,6 +34,32 @@ QX_API ErrorCode PolyRootsNtBst_head(QX_IN DBL1D coef, QX_IN DBL1D realGuesses,
 QX_API int32_t CxPolyRoots_head(QX_INOUT CDB1D coef, QX_IN const int32_t *maxIterations,
                                 QX_OUT ErrorCode *err);
 
+/** Distinct roots of a real polynomial and their multiplicities: the structure by repeated greatest
+    common divisors of the polynomial and its derivative, and with refine other than 0 the roots for
+    that structure by least squares (Z. Zeng, "Computing multiple roots of inexact polynomials",
+    2005). So a multiple root comes out as accurately as a simple one, where roots by deflation or
+    eigenvalues scatter around it. The tolerance says by how much the coefficients, those above 1
+    relative to their size, may be changed to make roots multiple, after the polynomial is made
+    monic and its roots are scaled around 1; one not above 0 is 1e-10.
+
+    `simple` holds the roots as the structure gives them, `refined` the refined ones, and
+    `multiplicities` one number for each; all have one entry per distinct root. Without refinement
+    `refined` is `simple`; with it the roots come by rising multiplicity and falling modulus. A root
+    0 comes last. Where no structure fits or the refinement does not converge, the roots are
+    eigenvalues of the companion matrix. Up to degree 2, roots at 0 apart, each root counts once.
+    coef stays as it is, but a failure empties it as well.
+    Codes: ErrEmptyInput (coef is empty), ErrOutOfMemory (no memory, or the host refuses an output),
+    ErrBadCoefficients (a coefficient is not finite), ErrAllCoefficientsZero (all coefficients are
+    0), ErrOrderNotPositive (the polynomial is constant), ErrNonFiniteInput (it overflows when it is
+    made monic), ErrIterationLimit (eigenvalues do not converge). */
+QX_API ErrorCode MultPolyRoots_head(QX_INOUT DBL1D coef, int32_t refine, double tolerance,
+                                    QX_OUT CDB1D refined, QX_OUT CDB1D simple,
+                                    QX_OUT I32_1D multiplicities);
+/** As MultPolyRoots_head, for complex coefficients. */
+QX_API ErrorCode CxMultPolyRoots_head(QX_INOUT CDB1D coef, int32_t refine, double tolerance,
+                                      QX_OUT CDB1D refined, QX_OUT CDB1D simple,
+                                      QX_OUT I32_1D multiplicities);
+
 QX_END_DECLS
 
 #endif

@@ -3,6 +3,7 @@
 #include "frame/export.h"
 #include "frame/scratch.h"
 #include "poly/complex_roots.h"
+#include "poly/multiple_roots.h"
 #include "poly/polished_roots.h"
 
 namespace qx {
@@ -58,6 +59,47 @@ Outcome FindRoots(InOut<CDB1D> coef, int32_t maxIterations) {
     return coef.resize(count);
 }
 
+CDB Widened(double x) { return {x, 0.0}; }
+CDB Widened(const CDB &z) { return z; }
+
+template <class Root>
+Outcome CopyOut(const Root *roots, int32_t count, auto &out) {
+    if (const Outcome bad = out.resize(count))
+        return bad;
+    for (std::ptrdiff_t i = 0; i < count; ++i)
+        out.data()[i] = roots[i];
+    return 0;
+}
+
+// kept: a failure empties the coefficients, too.
+template <class Handle>
+Outcome FindMultipleRoots(InOut<Handle> coef, int32_t refine, double tolerance, Out<CDB1D> refined,
+                          Out<CDB1D> simple, Out<I32_1D> multiplicities) {
+    if (coef.isEmpty())
+        return ErrEmptyInput;
+    const std::ptrdiff_t n = coef.size();
+    Scratch<ElementType::CDB> work;
+    if (const ErrorCode failed = work.allocate(3 * int64_t{n}))
+        return failed;
+    Scratch<ElementType::I32> times;
+    if (const ErrorCode failed = times.allocate(n))
+        return failed;
+    for (std::ptrdiff_t k = 0; k < n; ++k)
+        work[k] = Widened(coef.data()[k]);
+    int32_t refinedCount = 0, simpleCount = 0;
+    if (const ErrorCode failed =
+            MultipleRootsComplex(work.data(), static_cast<int32_t>(n), refine, tolerance, &work[n],
+                                 &refinedCount, &work[2 * n], times.data(), &simpleCount))
+        return failed;
+    if (const Outcome bad = CopyOut(&work[n], refinedCount, refined))
+        return bad;
+    if (const Outcome bad = CopyOut(&work[2 * n], simpleCount, simple))
+        return bad;
+    if (const Outcome bad = CopyOut(times.data(), simpleCount, multiplicities))
+        return bad;
+    return Merge(work.release(), times.release());
+}
+
 } // namespace
 } // namespace qx
 
@@ -75,4 +117,16 @@ ErrorCode PolyRootsNtBst_head(DBL1D coef, DBL1D realGuesses, int32_t newtonMaxIt
 
 int32_t CxPolyRoots_head(CDB1D coef, const int32_t *maxIterations, ErrorCode *err) {
     return InErr(err, qx::FindRoots, coef, *maxIterations);
+}
+
+ErrorCode MultPolyRoots_head(DBL1D coef, int32_t refine, double tolerance, CDB1D refined,
+                             CDB1D simple, I32_1D multiplicities) {
+    return Returned(qx::FindMultipleRoots<DBL1D>, coef, refine, tolerance, refined, simple,
+                    multiplicities);
+}
+
+ErrorCode CxMultPolyRoots_head(CDB1D coef, int32_t refine, double tolerance, CDB1D refined,
+                               CDB1D simple, I32_1D multiplicities) {
+    return Returned(qx::FindMultipleRoots<CDB1D>, coef, refine, tolerance, refined, simple,
+                    multiplicities);
 }

@@ -19,6 +19,7 @@ namespace {
 
 using qx::test::CDBArray;
 using qx::test::DBLArray;
+using qx::test::I32Array;
 typedef std::complex<double> Complex;
 typedef std::vector<Complex> Complexes;
 
@@ -268,6 +269,208 @@ TEST(PolyRootsNtBst, EmptyAndNullArrays) {
     ASSERT_EQ(guesses.size(), 3);
     EXPECT_NEAR(guesses[1].re, 2, 1e-14);
     EXPECT_NEAR(guesses[2].re, 1, 1e-14);
+}
+
+struct Structure {
+    Complexes refined, simple;
+    std::vector<int32_t> multiplicities;
+};
+
+enum Refine : int32_t { AsFound = 0, Refined = 1 };
+
+Structure FindStructure(const Complexes &coefficients, Refine refine = Refined,
+                        double tolerance = 0) {
+    const CDBArray coef = ToHost(coefficients), refined, simple;
+    const I32Array multiplicities;
+    EXPECT_EQ(CxMultPolyRoots_head(coef.handle(), refine, tolerance, refined.handle(),
+                                   simple.handle(), multiplicities.handle()),
+              0);
+    EXPECT_EQ(Values(coef), coefficients) << "the coefficients stay";
+    return {Values(refined), Values(simple), multiplicities.values()};
+}
+// By the real export where the coefficients are real.
+Structure FindRealStructure(const Complexes &coefficients, Refine refine = Refined) {
+    std::vector<double> real;
+    for (const Complex &a : coefficients)
+        real.push_back(a.real());
+    const DBLArray coef(real);
+    const CDBArray refined, simple;
+    const I32Array multiplicities;
+    EXPECT_EQ(MultPolyRoots_head(coef.handle(), refine, 0, refined.handle(), simple.handle(),
+                                 multiplicities.handle()),
+              0);
+    return {Values(refined), Values(simple), multiplicities.values()};
+}
+
+struct Multiple {
+    Complex root;
+    int32_t times;
+};
+Complexes Expanded(const std::vector<Multiple> &roots) {
+    Complexes all;
+    for (const auto &[root, times] : roots)
+        all.insert(all.end(), times, root);
+    return Product(all);
+}
+
+// By rising multiplicity, then by falling modulus, as the refined roots come.
+std::vector<Multiple> Sorted(std::vector<Multiple> roots) {
+    std::stable_sort(roots.begin(), roots.end(), [](const Multiple &a, const Multiple &b) {
+        return a.times != b.times ? a.times < b.times : std::abs(a.root) > std::abs(b.root);
+    });
+    return roots;
+}
+
+double LargestError(const Complexes &found, const std::vector<Multiple> &expected) {
+    double worst = found.size() == expected.size() ? 0 : HUGE_VAL;
+    for (const Complex &z : found) {
+        double least = HUGE_VAL;
+        for (const auto &[root, times] : expected)
+            least = std::min(least, std::abs(z - root) / std::abs(root));
+        worst = std::max(worst, least);
+    }
+    return worst;
+}
+
+// The first four are published examples (Z. Zeng, 2005, with those of L. Brugnano and D. Trigiante,
+// 1995, and of M. Igarashi and T. Ypma, 1995, there), of which the first three are no less than
+// terrible for methods that know no multiplicity.
+const std::vector<std::vector<Multiple>> structures = {
+    {{1, 20}, {2, 15}, {3, 10}, {4, 5}},
+    {{{1, -0.01}, 20}, {{1, 0.01}, 20}, {-2, 3}},
+    {{-1, 8}, {0.2, 16}, {0.5, 24}, {1, 8}},
+    {{-1, 6}, {{0.5, 1}, 3}, {{0.5, -1}, 3}, {1, 2}, {0.5, 4}},
+    {{1, 3}},
+    {{{1, 1}, 4}, {{0.5, -2}, 2}, {{-2, 0.125}, 3}, {7, 1}},
+    {{1e10, 3}, {3e10, 2}},
+    {{1e-10, 3}, {{0, 3e-10}, 2}},
+    {{3, 1}, {2, 1}, {-1, 1}},
+};
+
+TEST(MultPolyRoots, StructuresAreRecoveredAndRootsAreAsAccurateAsSimpleOnes) {
+    for (const std::vector<Multiple> &example : structures) {
+        const Complexes coefficients = Expanded(example);
+        const Structure found = FindStructure(coefficients);
+        const std::vector<Multiple> expected = Sorted(example);
+        ASSERT_EQ(found.multiplicities.size(), expected.size());
+        for (std::size_t i = 0; i < expected.size(); ++i) {
+            EXPECT_EQ(found.multiplicities[i], expected[i].times);
+            EXPECT_NEAR(std::abs(found.refined[i]) / std::abs(expected[i].root), 1, 1e-12);
+        }
+        EXPECT_LT(LargestError(found.refined, expected), 1e-13);
+        EXPECT_LT(LargestError(found.simple, expected), 2e-10);
+        // The same without refinement, unsorted.
+        const Structure simple = FindStructure(coefficients, AsFound);
+        EXPECT_EQ(simple.refined, simple.simple);
+        EXPECT_LT(LargestError(simple.simple, expected), 2e-10);
+        for (std::size_t i = 0; i < simple.simple.size(); ++i) {
+            const Multiple *const nearest = &*std::min_element(
+                expected.begin(), expected.end(), [&](const Multiple &a, const Multiple &b) {
+                    return std::abs(simple.simple[i] - a.root) <
+                           std::abs(simple.simple[i] - b.root);
+                });
+            EXPECT_EQ(simple.multiplicities[i], nearest->times);
+        }
+    }
+}
+
+TEST(MultPolyRoots, SimpleRootsAreAsAccurateAsTheirCondition) {
+    for (const Case &example : ReadCases()) {
+        const Structure found = FindStructure(example.coefficients);
+        if (example.name == "clustered-0.001") {
+            EXPECT_EQ(found.refined.size(), 5U) << "within the tolerance two roots are one";
+            continue;
+        }
+        // Eigenvalues are accurate relative to the largest one, which is 1e30 times the others
+        // here.
+        if (example.name == "small")
+            continue;
+        EXPECT_LT(WorstError(example, found.refined), 1.7) << example.name;
+    }
+}
+
+TEST(MultPolyRoots, RootsOfRealPolynomialsAreRealOrPaired) {
+    const std::vector<Multiple> example = {
+        {-1, 6}, {{0.5, 1}, 3}, {{0.5, -1}, 3}, {1, 2}, {0.5, 4}};
+    for (const Refine refine : {AsFound, Refined}) {
+        const Structure found = FindRealStructure(Expanded(example), refine);
+        ASSERT_EQ(found.refined.size(), 5U);
+        int32_t degree = 0;
+        for (std::size_t i = 0; i < 5; ++i) {
+            degree += found.multiplicities[i];
+            if (std::abs(found.refined[i].imag()) < 0.5)
+                EXPECT_EQ(found.refined[i].imag(), 0.0);
+            else
+                EXPECT_EQ(std::count(found.simple.begin(), found.simple.end(),
+                                     std::conj(found.simple[i])),
+                          1);
+        }
+        EXPECT_EQ(degree, 18);
+    }
+}
+
+TEST(MultPolyRoots, TheToleranceTellsWhatIsMultiple) {
+    Complexes coefficients = Expanded({{1, 3}, {-2, 2}, {{0, 1}, 1}});
+    double sign = 1;
+    for (Complex &a : coefficients)
+        a *= 1 + 1e-8 * (sign = -sign);
+    const Structure strict = FindStructure(coefficients);
+    EXPECT_EQ(strict.multiplicities, (std::vector<int32_t>(6, 1)));
+    const Structure loose = FindStructure(coefficients, Refined, 1e-6);
+    EXPECT_EQ(loose.multiplicities, (std::vector<int32_t>{1, 2, 3}));
+    EXPECT_LT(LargestError(loose.refined, {{1, 3}, {-2, 2}, {{0, 1}, 1}}), 1e-6);
+}
+
+// With a tolerance of 1 nearly everything is a structure, and none holds: eigenvalues stand in.
+TEST(MultPolyRoots, WithoutAStructureTheRootsAreEigenvalues) {
+    const Complexes coefficients = {{-4, 1},   {3, 0.5}, {0, -2},  {1, 1},
+                                    {-0.5, 0}, {2, -1},  {0.25, 3}};
+    const Structure exact = FindStructure(coefficients);
+    const Structure loose = FindStructure(coefficients, Refined, 1.0);
+    EXPECT_EQ(loose.multiplicities, std::vector<int32_t>(6, 1));
+    EXPECT_EQ(loose.refined, loose.simple);
+    std::vector<Multiple> expected;
+    for (const Complex &root : exact.refined)
+        expected.push_back({root, 1});
+    EXPECT_LT(LargestError(loose.refined, expected), 1e-14);
+}
+
+TEST(MultPolyRoots, RootsAtZeroAndLowDegrees) {
+    for (const Refine refine : {AsFound, Refined}) {
+        const Structure quintic = FindStructure({0, 0, -2, 5, -4, 1}, refine); // x^2 (x-1)^2 (x-2)
+        EXPECT_EQ(quintic.multiplicities.back(), 2);
+        EXPECT_EQ(quintic.refined.back(), Complex(0));
+        EXPECT_EQ(quintic.simple.back(), Complex(0));
+        EXPECT_EQ(quintic.refined.size(), 3U);
+
+        const Structure power = FindStructure({0, 0, 0, 2, 0}, refine);
+        EXPECT_EQ(power.refined, Complexes{0});
+        EXPECT_EQ(power.multiplicities, std::vector<int32_t>{3});
+
+        const Structure linear = FindStructure({0, 6, -3}, refine);
+        EXPECT_EQ(linear.refined, (Complexes{2, 0}));
+        EXPECT_EQ(linear.multiplicities, (std::vector<int32_t>{1, 1}));
+
+        const Structure square = FindStructure({1, -2, 1, 0, 0}, refine);
+        EXPECT_EQ(square.simple, (Complexes{1, 1}));
+        EXPECT_EQ(square.multiplicities, (std::vector<int32_t>{1, 1}));
+    }
+}
+
+TEST(MultPolyRoots, FailuresEmptyTheCoefficientsToo) {
+    const auto code = [](const Complexes &coefficients) {
+        const CDBArray coef = ToHost(coefficients), refined(2), simple(3);
+        const I32Array multiplicities(4);
+        const ErrorCode status = CxMultPolyRoots_head(coef.handle(), 1, 0, refined.handle(),
+                                                      simple.handle(), multiplicities.handle());
+        EXPECT_EQ(coef.size() + refined.size() + simple.size() + multiplicities.size(), 0);
+        return status;
+    };
+    EXPECT_EQ(code({}), ErrEmptyInput);
+    EXPECT_EQ(code({1, {0, HUGE_VAL}, 1}), ErrBadCoefficients);
+    EXPECT_EQ(code({0, 0, 0}), ErrAllCoefficientsZero);
+    EXPECT_EQ(code({7, 0}), ErrOrderNotPositive);
+    EXPECT_EQ(code({1, 1e300, 1, 1, 1e-300}), ErrNonFiniteInput);
 }
 
 } // namespace

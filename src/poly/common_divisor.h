@@ -1,0 +1,88 @@
+#ifndef QX_POLY_COMMON_DIVISOR_H
+#define QX_POLY_COMMON_DIVISOR_H
+
+#include "frame/scratch.h"
+#include "linalg/scalar.h"
+#include "qx/errors.h"
+#include "qx/types.h"
+
+#include <cstdint>
+
+namespace qx {
+
+// A dense system of more equations than unknowns, solved in the sense of least squares.
+class LeastSquaresSystem {
+public:
+    ErrorCode allocate(int64_t maxRows, int64_t maxCols);
+    // All zero.
+    void reset(int32_t rows, int32_t cols);
+
+    CDB &at(std::ptrdiff_t row, std::ptrdiff_t col) const {
+        return augmented_[row * width() + col];
+    }
+    CDB &right(std::ptrdiff_t row) const { return at(row, cols_); }
+    void scaleRow(std::ptrdiff_t row, double factor);
+    // Column col + s becomes a[0..degree] from `row` + s on, for s = 0 to `shift`: the matrix that
+    // multiplies by the polynomial.
+    void addProductBy(const CDB *a, int32_t degree, int32_t shift, int32_t row, int32_t col);
+
+    // ErrNonFiniteInput, ErrOutOfMemory. What depends on other columns comes out as no number.
+    ErrorCode solve(CDB *x);
+
+private:
+    std::ptrdiff_t width() const { return cols_ + 1; }
+    Scratch<ElementType::CDB> augmented_, triangle_;
+    std::ptrdiff_t rows_ = 0, cols_ = 0;
+};
+
+// The greatest common divisor of a monic polynomial p and its derivative, with descending
+// coefficients: p = u v and p' / n = u w, nearly. Step k asks whether a v of degree k will do.
+class CommonDivisor {
+public:
+    ErrorCode allocate(int32_t maxDegree);
+
+    // Takes the smallest degree of v, up to `largest`, for which the coefficients of the products
+    // are off by no more than `tolerance`, relative to those above 1. Degree n always is one, with
+    // u = 1.
+    ErrorCode find(const CDB *p, int32_t n, int32_t largest, double tolerance);
+    bool isFound() const { return quotientDegree_ >= 0; }
+    int32_t quotientDegree() const { return quotientDegree_; }
+    const CDB *divisor() const { return unknowns_.data(); } // u, of degree n - quotientDegree
+    const CDB *quotient() const { return v(); }
+    double error() const { return residual_; }
+
+private:
+    // The Sylvester matrix of step k has the products of p' / n by x^k ... 1 and of p by x^(k-1)
+    // ... 1 in its columns; it is triangular already from the columns of the steps before.
+    CDB *column(std::ptrdiff_t j) const { return &sylvester_[j * 2 * capacity_]; }
+    void appendColumn(const CDB *a, int32_t degree, int32_t shift, int32_t rows);
+    double smallestSingularValue(int32_t cols);
+    void solveAdjoint(int32_t cols, const CDB *x, CDB *y) const;
+    void solveTriangle(int32_t cols, CDB *x) const;
+
+    double pivot(std::ptrdiff_t i) const;
+
+    ErrorCode tryDegree(int32_t k, double tolerance, bool *isDivisor);
+    ErrorCode firstGuess();
+    ErrorCode refine();
+    void setUpStep();
+    double residual() const;
+    static double weight(CDB coefficient);
+
+    CDB *u() const { return unknowns_.data(); }
+    CDB *v() const { return u() + (n_ - degree_ + 1); }
+    CDB *w() const { return v() + (degree_ + 1); }
+
+    int32_t capacity_ = 0, n_ = 0, degree_ = 0, columns_ = 0;
+    int32_t quotientDegree_ = -1;
+    double residual_ = 0.0;
+    const CDB *p_ = nullptr;
+    Scratch<ElementType::CDB> sylvester_, vectors_, kappas_;
+    Scratch<ElementType::DBL> diagonal_;
+    Scratch<ElementType::CDB> slope_, unknowns_, step_;
+    LeastSquaresSystem system_;
+};
+
+} // namespace qx
+
+#endif

@@ -1,0 +1,206 @@
+#include "poly/multiple_roots.h"
+
+#include "frame/constants.h"
+#include "frame/scratch.h"
+#include "poly/complex_arithmetic.h"
+#include "poly/complex_roots.h"
+#include "poly/root_structure.h"
+
+#include <cmath>
+
+namespace qx {
+namespace {
+
+// The roots as they come along. `refined` follows `simple` where it is not refined.
+struct RootRecords {
+    CDB *refined, *simple;
+    I32 *multiplicity;
+    int32_t count;
+
+    void append(CDB root, int32_t times) {
+        refined[count] = simple[count] = root;
+        multiplicity[count] = times;
+        ++count;
+    }
+    int32_t degree() const {
+        int64_t sum = 0;
+        for (int32_t i = 0; i < count; ++i)
+            sum += multiplicity[i];
+        return static_cast<int32_t>(sum);
+    }
+    void scale(double factor) {
+        for (int32_t i = 0; i < count; ++i) {
+            simple[i] = simple[i] * factor;
+            refined[i] = refined[i] * factor;
+        }
+    }
+};
+
+bool ComesBefore(int32_t timesA, CDB a, int32_t timesB, CDB b) {
+    return timesA != timesB ? timesA < timesB : ScaledHypot(a) > ScaledHypot(b);
+}
+
+// By rising multiplicity and falling modulus; equal ones keep their order.
+void SortRecords(RootRecords &roots) {
+    for (int32_t i = 1; i < roots.count; ++i) {
+        const CDB root = roots.simple[i];
+        const int32_t times = roots.multiplicity[i];
+        int32_t j = i;
+        for (; j > 0 && ComesBefore(times, root, roots.multiplicity[j - 1], roots.simple[j - 1]);
+             --j) {
+            roots.simple[j] = roots.simple[j - 1];
+            roots.multiplicity[j] = roots.multiplicity[j - 1];
+        }
+        roots.simple[j] = root;
+        roots.multiplicity[j] = times;
+    }
+}
+
+// p[k] / sigma^k, the polynomial whose roots are sigma times smaller; false where that overflows.
+bool DividePowers(const CDB *p, int32_t degree, double sigma, CDB *scaled) {
+    double power = 1.0;
+    for (int32_t k = 0; k <= degree; ++k) {
+        scaled[k] = p[k] / power;
+        if (!IsFinite(scaled[k]))
+            return false;
+        power *= sigma;
+    }
+    return true;
+}
+
+// A monic polynomial with descending coefficients whose roots are around 1 in size, and by how much
+// they are smaller.
+class NormalisedPolynomial {
+public:
+    ErrorCode assign(const CDB *ascending, int32_t degree) {
+        if (const ErrorCode failed = work_.allocate(2 * (int64_t{degree} + 1)))
+            return failed;
+        CDB *const monic = work_.data(), *const scaled = monic + degree + 1;
+        for (int32_t k = 0; k <= degree; ++k)
+            monic[k] = Quotient(ascending[degree - k], ascending[degree]);
+        monic[0] = {1.0, 0.0};
+        coefficients_ = monic;
+        sigma_ = std::pow(ScaledHypot(monic[degree]), 1.0 / degree);
+        if (sigma_ != 1.0 && DividePowers(monic, degree, sigma_, scaled))
+            coefficients_ = scaled;
+        else
+            sigma_ = 1.0;
+        return 0;
+    }
+    const CDB *coefficients() const { return coefficients_; }
+    double sigma() const { return sigma_; }
+
+private:
+    Scratch<ElementType::CDB> work_;
+    const CDB *coefficients_ = nullptr;
+    double sigma_ = 1.0;
+};
+
+// What is told apart is told by the bits.
+ErrorCode TakeEigenvalues(const CDB *p, int32_t degree, RootRecords &roots) {
+    CDB *const values = roots.simple; // read ahead of what is written
+    if (const ErrorCode failed = CompanionRoots(p, degree, values))
+        return failed;
+    roots.count = 0;
+    for (int32_t i = 0; i < degree; ++i) {
+        const CDB value = values[i];
+        int32_t same = 0;
+        while (same < roots.count &&
+               !(roots.simple[same].re == value.re && roots.simple[same].im == value.im))
+            ++same;
+        if (same < roots.count)
+            ++roots.multiplicity[same];
+        else
+            roots.append(value, 1);
+    }
+    return 0;
+}
+
+// ErrIterationLimit where the steps do not converge.
+ErrorCode Refine(const CDB *p, int32_t degree, double tolerance, RootRecords &roots) {
+    SortRecords(roots);
+    for (int32_t i = 0; i < roots.count; ++i)
+        roots.refined[i] = roots.simple[i];
+    return PejorativeRefine(p, degree, tolerance, roots.refined, roots.multiplicity, roots.count);
+}
+
+// Real roots stay real where the refinement moved them off the axis by rounding errors alone.
+void DropRoundingErrors(int32_t degree, RootRecords &roots) {
+    for (int32_t i = 0; i < roots.count; ++i)
+        if (roots.simple[i].im == 0.0 && std::fabs(roots.refined[i].im) < degree * kEpsilon)
+            roots.refined[i].im = 0.0;
+}
+
+// Degree 3 and above, no root at 0.
+ErrorCode FindStructure(const CDB *ascending, int32_t degree, bool refines, double tolerance,
+                        RootRecords &roots) {
+    NormalisedPolynomial normalised;
+    if (const ErrorCode failed = normalised.assign(ascending, degree))
+        return failed;
+    const CDB *const p = normalised.coefficients();
+    if (const ErrorCode failed =
+            GCDRootStructure(p, degree, tolerance, roots.simple, roots.multiplicity, &roots.count))
+        return failed;
+    bool isFound = roots.degree() == degree;
+    if (isFound && refines) {
+        const ErrorCode status = Refine(p, degree, tolerance, roots);
+        if (status != 0 && status != ErrIterationLimit)
+            return status;
+        isFound = status == 0;
+    } else if (isFound) {
+        for (int32_t i = 0; i < roots.count; ++i)
+            roots.refined[i] = roots.simple[i];
+    }
+    if (!isFound)
+        if (const ErrorCode failed = TakeEigenvalues(p, degree, roots))
+            return failed;
+    roots.scale(normalised.sigma());
+    if (isFound && refines)
+        DropRoundingErrors(degree, roots);
+    return 0;
+}
+
+// kept: a double root of a quadratic is two roots here.
+void SolveDirectly(const CDB *a, int32_t degree, RootRecords &roots) {
+    CDB found[2] = {};
+    if (degree == 1)
+        found[0] = Quotient(-a[0], a[1]);
+    else if (degree == 2)
+        CxQuadraticRoots(a[0], a[1], a[2], found);
+    for (int32_t i = 0; i < degree; ++i)
+        roots.append(found[i], 1);
+}
+
+} // namespace
+
+ErrorCode MultipleRootsComplex(const CDB *coef, int32_t n, int32_t refine, double tolerance,
+                               CDB *refined, int32_t *refinedCount, CDB *simple, I32 *multiplicity,
+                               int32_t *simpleCount) {
+    if (n < 1)
+        return ErrEmptyInput;
+    for (int32_t k = 0; k < n; ++k)
+        if (!IsFinite(coef[k]))
+            return ErrBadCoefficients;
+    if (!(tolerance > 0.0))
+        tolerance = 1e-10;
+    int32_t degree = n - 1;
+    while (degree >= 0 && IsZero(coef[degree]))
+        --degree;
+    if (degree < 1)
+        return degree < 0 ? ErrAllCoefficientsZero : ErrOrderNotPositive;
+    int32_t zeros = 0;
+    while (IsZero(coef[zeros]))
+        ++zeros;
+    RootRecords roots = {refined, simple, multiplicity, 0};
+    if (degree - zeros < 3)
+        SolveDirectly(coef + zeros, degree - zeros, roots);
+    else if (const ErrorCode failed =
+                 FindStructure(coef + zeros, degree - zeros, refine != 0, tolerance, roots))
+        return failed;
+    if (zeros > 0)
+        roots.append({0.0, 0.0}, zeros);
+    *refinedCount = *simpleCount = roots.count;
+    return 0;
+}
+
+} // namespace qx

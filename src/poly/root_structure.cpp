@@ -1,0 +1,282 @@
+#include "poly/root_structure.h"
+
+#include "frame/constants.h"
+#include "frame/scratch.h"
+#include "linalg/eigenproblems/general.h"
+#include "poly/common_divisor.h"
+#include "poly/complex_arithmetic.h"
+
+#include <algorithm>
+#include <cmath>
+
+namespace qx {
+namespace {
+
+constexpr auto Real = ElementType::DBL;
+constexpr auto Complex = ElementType::CDB;
+
+void CoefficientOf(CDB coefficient, DBL *out) { *out = coefficient.re; }
+void CoefficientOf(CDB coefficient, CDB *out) { *out = coefficient; }
+ErrorCode Eigenvalues(const DBL *a, int32_t n, CDB *values) {
+    return EigenGeneral(a, n, eigenValuesOnly, values, nullptr);
+}
+ErrorCode Eigenvalues(const CDB *a, int32_t n, CDB *values) {
+    return CxEigenGeneral(a, n, generalMatrix, eigenValuesOnly, values, nullptr);
+}
+
+template <ElementType E>
+ErrorCode EigenvaluesOfCompanion(const CDB *p, int32_t degree, CDB *roots) {
+    Scratch<E> companion;
+    if (const ErrorCode failed = companion.allocate(int64_t{degree} * degree))
+        return failed;
+    for (std::ptrdiff_t i = 0; i < degree; ++i) {
+        for (std::ptrdiff_t j = 0; j < degree; ++j)
+            CoefficientOf({i == j + 1 ? 1.0 : 0.0, 0.0}, &companion[i * degree + j]);
+        CoefficientOf(-p[i + 1], &companion[i]);
+    }
+    const ErrorCode status = Eigenvalues(companion.data(), degree, roots);
+    return Merge(status, companion.release());
+}
+
+// Each root of the next level raises the nearest one of those that have come along so far.
+void RaiseNearest(const CDB *found, int32_t foundCount, int32_t level, const CDB *roots,
+                  I32 *multiplicities, int32_t rootCount) {
+    for (int32_t i = 0; i < foundCount; ++i) {
+        int32_t nearest = -1;
+        double least = kInfinity;
+        for (int32_t j = 0; j < rootCount; ++j) {
+            const double distance = ScaledHypot(found[i] - roots[j]);
+            if (multiplicities[j] == level - 1 && distance < least) {
+                nearest = j;
+                least = distance;
+            }
+        }
+        if (nearest >= 0)
+            multiplicities[nearest] = level;
+    }
+}
+
+// Coefficients of the product, to which a factor x - root is added at a time.
+class GrowingProduct {
+public:
+    GrowingProduct(CDB *coefficients) : a_(coefficients) { a_[0] = {1.0, 0.0}; }
+    GrowingProduct(CDB *coefficients, const GrowingProduct &other)
+        : a_(coefficients), degree_(other.degree_) {
+        for (int32_t i = 0; i <= degree_; ++i)
+            a_[i] = other.a_[i];
+    }
+    void multiply(CDB root) {
+        a_[degree_ + 1] = {};
+        for (int32_t i = degree_ + 1; i > 0; --i)
+            a_[i] -= root * a_[i - 1];
+        ++degree_;
+    }
+
+private:
+    CDB *a_;
+    int32_t degree_ = 0;
+};
+
+// The order in which factors keep the coefficients of their product accurate, after F. Leja: each
+// root is the one farthest from those before it, by the product of the distances. `distances` is
+// work memory.
+void OrderForProducts(const CDB *roots, int32_t count, I32 *order, DBL *distances) {
+    for (int32_t j = 0; j < count; ++j) {
+        order[j] = j;
+        distances[j] = std::log(ScaledHypot(roots[j]));
+    }
+    for (int32_t i = 0; i < count; ++i) {
+        int32_t next = i;
+        for (int32_t j = i + 1; j < count; ++j)
+            if (distances[order[j]] > distances[order[next]])
+                next = j;
+        Swap(&order[i], &order[next]);
+        const CDB chosen = roots[order[i]];
+        for (int32_t j = i + 1; j < count; ++j) {
+            const double distance = std::log(ScaledHypot(roots[order[j]] - chosen));
+            distances[order[j]] = (i == 0 ? 0.0 : double(distances[order[j]])) + distance;
+        }
+    }
+}
+
+// The Gauss-Newton steps of PejorativeRefine.
+class RootRefinement {
+public:
+    RootRefinement(const CDB *p, int32_t degree, CDB *roots, const I32 *multiplicities,
+                   int32_t rootCount)
+        : p_(p), roots_(roots), multiplicities_(multiplicities), degree_(degree),
+          count_(rootCount) {}
+
+    ErrorCode allocate() {
+        if (const ErrorCode failed = work_.allocate(2 * (int64_t{degree_} + 1) + count_))
+            return failed;
+        if (const ErrorCode failed = best_.allocate(count_))
+            return failed;
+        if (const ErrorCode failed = order_.allocate(count_))
+            return failed;
+        Scratch<Real> distances;
+        if (const ErrorCode failed = distances.allocate(count_))
+            return failed;
+        OrderForProducts(roots_, count_, order_.data(), distances.data());
+        return Merge(system_.allocate(degree_, count_), distances.release());
+    }
+
+    // The relative size of the step, or the code with which it failed.
+    ErrorCode step(double *size) {
+        CDB *const change = work_.data() + 2 * (std::ptrdiff_t{degree_} + 1);
+        if (const ErrorCode failed = system_.solve(change))
+            return failed;
+        double ofChange = 0.0, ofRoots = 0.0;
+        for (int32_t j = 0; j < count_; ++j) {
+            ofRoots += SquaredModulus(roots_[j]);
+            ofChange += SquaredModulus(change[j]);
+            roots_[j] -= change[j];
+        }
+        *size = std::sqrt(ofChange / ofRoots);
+        return 0;
+    }
+    // The best roots so far. Errors of the size of rounding errors are equally good.
+    void keepIfBest() {
+        const double rounding = degree_ * kEpsilon;
+        if (!(error_ <= (leastError_ > rounding ? leastError_ : rounding)))
+            return;
+        leastError_ = error_;
+        for (int32_t j = 0; j < count_; ++j)
+            best_[j] = roots_[j];
+    }
+    double restoreBest() {
+        for (int32_t j = 0; j < count_; ++j)
+            roots_[j] = best_[j];
+        return leastError_;
+    }
+
+    // The next step, and the backward error of the roots as they stand. With s the product of (x -
+    // root)^(multiplicity - 1), the polynomial is s times all x - root, and its derivative by root
+    // j is -multiplicity s times all but the j-th.
+    void setUp() {
+        const std::ptrdiff_t length = std::ptrdiff_t{degree_} + 1;
+        CDB *const powers = work_.data(), *const product = powers + length;
+        const GrowingProduct base = multiplyPowers(powers);
+        system_.reset(degree_, count_);
+        for (int32_t j = 0; j < count_; ++j) {
+            multiplyAllBut(j, GrowingProduct(product, base));
+            for (int32_t i = 0; i < degree_; ++i)
+                system_.at(i, j) = product[i] * -double(multiplicities_[j]);
+        }
+        multiplyAllBut(count_, GrowingProduct(product, base));
+        error_ = 0.0;
+        for (int32_t i = 0; i < degree_; ++i) {
+            const double size = Modulus(p_[i + 1]), weight = size > 1.0 ? 1.0 / size : 1.0;
+            system_.right(i) = product[i + 1] - p_[i + 1];
+            const double off = Modulus(system_.right(i)) * weight;
+            if (!(off <= error_) && error_ == error_)
+                error_ = off; // NaN stays
+            system_.scaleRow(i, weight);
+        }
+    }
+
+private:
+    GrowingProduct multiplyPowers(CDB *coefficients) const {
+        GrowingProduct product(coefficients);
+        bool isComplete = false;
+        for (int32_t times = 1; !isComplete; ++times) {
+            isComplete = true;
+            for (int32_t i = 0; i < count_; ++i) {
+                if (times < multiplicities_[order_[i]]) {
+                    product.multiply(roots_[order_[i]]);
+                    isComplete = false;
+                }
+            }
+        }
+        return product;
+    }
+    void multiplyAllBut(int32_t j, GrowingProduct product) const {
+        for (int32_t i = 0; i < count_; ++i)
+            if (order_[i] != j)
+                product.multiply(roots_[order_[i]]);
+    }
+
+    const CDB *p_;
+    CDB *roots_;
+    const I32 *multiplicities_;
+    int32_t degree_, count_;
+    double error_ = 0.0, leastError_ = kInfinity;
+    Scratch<Complex> work_, best_;
+    Scratch<ElementType::I32> order_;
+    LeastSquaresSystem system_;
+};
+
+} // namespace
+
+ErrorCode CompanionRoots(const CDB *p, int32_t degree, CDB *roots) {
+    for (int32_t i = 1; i <= degree; ++i)
+        if (p[i].im != 0.0)
+            return EigenvaluesOfCompanion<Complex>(p, degree, roots);
+    const ErrorCode status = EigenvaluesOfCompanion<Real>(p, degree, roots);
+    // The complex iteration has other shifts.
+    return status != ErrIterationLimit ? status : EigenvaluesOfCompanion<Complex>(p, degree, roots);
+}
+
+ErrorCode GCDRootStructure(const CDB *p, int32_t degree, double tolerance, CDB *roots,
+                           I32 *multiplicities, int32_t *rootCount) {
+    constexpr double errorGrowth = 100.0;
+    *rootCount = 0;
+    CommonDivisor divisor;
+    if (const ErrorCode failed = divisor.allocate(degree))
+        return failed;
+    Scratch<Complex> work;
+    if (const ErrorCode failed = work.allocate(2 * int64_t{degree} + 1))
+        return failed;
+    CDB *const current = work.data(), *const found = current + degree + 1;
+    for (int32_t i = 0; i <= degree; ++i)
+        current[i] = p[i];
+    int32_t left = degree, largest = degree;
+    for (int32_t level = 1; left > 0; ++level) {
+        if (const ErrorCode failed = divisor.find(current, left, largest, tolerance))
+            return failed;
+        if (!divisor.isFound())
+            break;
+        const int32_t count = divisor.quotientDegree();
+        CDB *const target = level == 1 ? roots : found;
+        if (const ErrorCode failed = CompanionRoots(divisor.quotient(), count, target))
+            return failed;
+        if (level == 1) {
+            *rootCount = count;
+            for (int32_t j = 0; j < count; ++j)
+                multiplicities[j] = 1;
+        } else {
+            RaiseNearest(found, count, level, roots, multiplicities, *rootCount);
+        }
+        left -= count;
+        largest = count;
+        for (int32_t i = 0; i <= left; ++i)
+            current[i] = divisor.divisor()[i];
+        tolerance = std::max(tolerance, errorGrowth * divisor.error());
+    }
+    return 0;
+}
+
+ErrorCode PejorativeRefine(const CDB *p, int32_t degree, double tolerance, CDB *roots,
+                           const I32 *multiplicities, int32_t rootCount) {
+    constexpr int32_t stepLimit = 30;
+    RootRefinement refinement(p, degree, roots, multiplicities, rootCount);
+    if (const ErrorCode failed = refinement.allocate())
+        return failed;
+    double before = kInfinity, size = 0.0;
+    refinement.setUp();
+    for (int32_t turn = 0; turn < stepLimit; ++turn) {
+        refinement.keepIfBest();
+        if (const ErrorCode failed = refinement.step(&size))
+            return failed == ErrOutOfMemory ? failed : ErrIterationLimit;
+        refinement.setUp();
+        // Steps that shrink no more are rounding errors, if they are small.
+        if (!(size > 4.0 * kEpsilon && size < 0.5 * before) && turn > 0)
+            break;
+        before = size;
+    }
+    refinement.keepIfBest();
+    const bool isSettled = size < 1e-3 && refinement.restoreBest() <= 100.0 * tolerance;
+    return isSettled ? 0 : ErrIterationLimit;
+}
+
+} // namespace qx
