@@ -110,7 +110,9 @@ class Writer:
         self.names = {"__name__": "qx", "_byref": ctypes.byref, "_tell": tell, "_whole": whole,
                       "_real": real, "_c_number": c_number, "_word": plans.word, "_Record": Record,
                       "_address": address, "_pointer": pointer, "_buffer": buffer, "_many": many,
-                      "_mapped": mapped, "_procedure": procedure}
+                      "_mapped": mapped, "_procedure": procedure,
+                      # An argument may be called as a type is.
+                      "_type": type, "_int": int, "_float": float, "_complex": complex}
         for i, argument in enumerate(entry["arguments"]):
             kind = argument["kind"]
             getattr(self, "_array" if kind.startswith("array") else f"_{kind}")(i, argument)
@@ -142,10 +144,10 @@ class Writer:
         name, element, place = python_name(argument), argument["element"], self._place(argument)
         if element in LIMITS:
             lowest, highest = LIMITS[element]
-            self.before += [f"if type({name}) is not int or not {lowest} <= {name} <= {highest}:",
+            self.before += [f"if _type({name}) is not _int or not {lowest} <= {name} <= {highest}:",
                             f"    {name} = _whole({name}, '{element}', {place})"]
         else:
-            self.before += [f"if type({name}) is not float:", f"    {name} = _real({name}, {place})"]
+            self.before += [f"if _type({name}) is not _float:", f"    {name} = _real({name}, {place})"]
 
     def _value(self, i, argument):
         if argument["element"] in COMPLEX:
@@ -168,7 +170,7 @@ class Writer:
     _inout = _reference
 
     def _take(self, i, element):
-        self.results.append(f"complex(*_{i})" if element in COMPLEX else f"_{i}.value")
+        self.results.append(f"_complex(*_{i})" if element in COMPLEX else f"_{i}.value")
 
     def _output(self, i, argument):
         self.names[f"_type{i}"] = C_TYPES[argument["element"]]
@@ -223,7 +225,7 @@ class Writer:
     def _mapping(self):
         """The way of a function of numbers that is given arrays."""
         given = [a for a in self.entry["arguments"] if is_given(a)]
-        plain = " and ".join(f"type({python_name(a)}) is {'int' if a['element'] in LIMITS else 'float'}"
+        plain = " and ".join(f"_type({python_name(a)}) is {'_int' if a['element'] in LIMITS else '_float'}"
                              for a in given)
         values = ", ".join(map(python_name, given)) + ","
         self.names["_entry"] = self.entry

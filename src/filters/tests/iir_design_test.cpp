@@ -1,0 +1,326 @@
+#include "qx/iir_design.h"
+
+#include "qx/errors.h"
+#include "tests/support/hostile_host.h"
+#include "tests/support/table.h"
+#include "tests/support/test_data.h"
+
+#include <gtest/gtest.h>
+
+#include <cmath>
+#include <complex>
+#include <limits>
+#include <numbers>
+#include <string>
+#include <vector>
+
+namespace {
+
+using qx::test::DBLArray;
+using qx::test::ReadTable;
+using qx::test::ResetHost;
+using qx::test::TableRow;
+using qx::test::TestData;
+typedef std::complex<long double> Complex;
+
+constexpr long double pi = std::numbers::pi_v<long double>;
+constexpr double nan = std::numeric_limits<double>::quiet_NaN();
+
+enum Family { BW, Chebyshev, InvChebyshev, Elliptic, Bessel };
+const std::vector<std::string> familyNames = {"BW", "Chebyshev", "InvChebyshev", "Elliptic",
+                                              "Bessel"};
+enum Type : int32_t { Lowpass, Highpass, Bandpass, Bandstop };
+constexpr int32_t plain = -1; // the export without a form
+
+struct Design {
+    int family;
+    int32_t order, type;
+    double fl = 0.1, fh = 0.23, ripple = 1.0, attenuation = 60.0, fs = 1.0;
+    int32_t form = plain;
+};
+
+struct Cascade {
+    std::vector<double> a, b;
+    std::size_t order = 2; // of a section
+    ErrorCode err = 99;
+
+    std::size_t sections() const { return a.size() / order; }
+    Complex section(std::size_t s, double frequency) const {
+        const Complex z = std::polar(1.0L, -2 * pi * frequency);
+        Complex above = 0.0L, below = 0.0L;
+        for (std::size_t k = order + 1; k-- > 0;) {
+            above = above * z + static_cast<long double>(b[(order + 1) * s + k]);
+            below = below * z + static_cast<long double>(k == 0 ? 1.0 : a[order * s + k - 1]);
+        }
+        return above / below;
+    }
+    Complex at(double frequency) const {
+        Complex h = 1.0L;
+        for (std::size_t s = 0; s < sections(); ++s)
+            h *= section(s, frequency);
+        return h;
+    }
+    double gain(double frequency) const { return static_cast<double>(std::abs(at(frequency))); }
+    double decibels(double frequency) const { return 20 * std::log10(gain(frequency)); }
+};
+
+int32_t Call(const Design &d, DBL1D a, DBL1D b, ErrorCode *err) {
+    const double *fs = &d.fs, *fl = &d.fl, *fh = &d.fh, *rp = &d.ripple, *rs = &d.attenuation;
+    const int32_t *n = &d.order, *t = &d.type, f = d.form;
+    switch (d.family) {
+    case BW:
+        return f == plain ? BWCoefs(fs, fl, fh, n, t, a, b, err)
+                          : BWCoefs90(fs, fl, fh, n, t, f, a, b, err);
+    case Chebyshev:
+        return f == plain ? ChebyshevCoefs(fs, fl, fh, rp, n, t, a, b, err)
+                          : ChebyshevCoefs90(fs, fl, fh, rp, n, t, f, a, b, err);
+    case InvChebyshev:
+        return f == plain ? InvChebyshevCoefs(fs, fl, fh, rs, n, t, a, b, err)
+                          : InvChebyshevCoefs90(fs, fl, fh, rs, n, t, f, a, b, err);
+    case Elliptic:
+        return f == plain ? EllipticCoefs(fs, fl, fh, rp, rs, n, t, a, b, err)
+                          : EllipticCoefs90(fs, fl, fh, rp, rs, n, t, f, a, b, err);
+    default:
+        return f == plain ? BesselCoefs(fs, fl, fh, n, t, a, b, err)
+                          : BesselCoefs90(fs, fl, fh, n, t, f, a, b, err);
+    }
+}
+
+Cascade Designed(const Design &d) {
+    const DBLArray a(std::vector<double>(3, 7.0)), b(std::vector<double>(3, 7.0));
+    Cascade cascade;
+    EXPECT_EQ(Call(d, a.handle(), b.handle(), &cascade.err), 0);
+    cascade.a = a.values();
+    cascade.b = b.values();
+    cascade.order = (d.form == plain ? d.type >= Bandpass : d.form == 1) ? 4 : 2;
+    EXPECT_EQ(cascade.b.size(), cascade.sections() * (cascade.order + 1));
+    return cascade;
+}
+
+int FamilyOf(const std::string &name) {
+    int family = 0;
+    while (familyNames[static_cast<std::size_t>(family)] != name)
+        ++family;
+    return family;
+}
+
+// In all forms; the split of a band filter into second-order sections costs some digits.
+TEST(IIRDesign, AgreesWithSciPyInThePassBand) {
+    ResetHost();
+    for (const TableRow &row : ReadTable(TestData("iir_design.dat"))) {
+        const auto &v = row.arguments;
+        Design design = {FamilyOf(row.name),
+                         static_cast<int32_t>(v[0]),
+                         static_cast<int32_t>(v[1]),
+                         v[2],
+                         v[3],
+                         v[4],
+                         v[5]};
+        for (const int32_t form : {plain, 0, 1}) {
+            design.form = form;
+            EXPECT_NEAR(Designed(design).decibels(v[6]), row.value, 1e-9) << row.text << form;
+        }
+    }
+}
+
+// The analog frequency of the prototype at a frequency of the filter.
+long double PrototypeFrequency(const Design &d, double frequency) {
+    const long double at = std::tan(pi * frequency / d.fs), low = std::tan(pi * d.fl / d.fs),
+                      high = std::tan(pi * d.fh / d.fs);
+    const long double band = (at * at - low * high) / (at * (high - low));
+    return d.type == Lowpass    ? at / low
+           : d.type == Highpass ? low / at
+           : d.type == Bandpass ? band
+                                : 1 / band;
+}
+
+long double ChebyshevPolynomial(int32_t n, long double x) {
+    x = std::fabs(x);
+    return x <= 1 ? std::cos(n * std::acos(x)) : std::cosh(n * std::acosh(x));
+}
+
+double ClosedFormGain(const Design &d, double frequency) {
+    const long double w = PrototypeFrequency(d, frequency);
+    long double excess = std::pow(w, 2 * d.order);
+    if (d.family == Chebyshev) {
+        const long double T = ChebyshevPolynomial(d.order, w);
+        excess = (std::pow(10.0L, d.ripple / 10) - 1) * T * T;
+    } else if (d.family == InvChebyshev) {
+        const long double T = ChebyshevPolynomial(d.order, 1 / w);
+        excess = (std::pow(10.0L, d.attenuation / 10) - 1) / (T * T);
+    }
+    return static_cast<double>(1 / std::sqrt(1 + excess));
+}
+
+// Pass band and stop band, at a rate that is not 1, and far beyond the orders that are in use.
+TEST(IIRDesign, HasTheGainOfItsDefinition) {
+    ResetHost();
+    for (int family = BW; family <= InvChebyshev; ++family)
+        for (int32_t type = Lowpass; type <= Bandstop; ++type)
+            for (const int32_t order : {1, 2, 3, 7, 12, 25, 40}) {
+                const Design design = {family, order, type, 9000, 15000, 0.5, 50, 48000};
+                const Cascade cascade = Designed(design);
+                ASSERT_EQ(cascade.err, 0);
+                for (const double f : {100.0, 5000.0, 8800.0, 9000.0, 12000.0, 15000.0, 19000.0})
+                    EXPECT_NEAR(cascade.gain(f / 48000), ClosedFormGain(design, f), 1e-9)
+                        << familyNames[static_cast<std::size_t>(family)] << " " << type << " "
+                        << order << " " << f;
+            }
+}
+
+TEST(IIRDesign, EllipticFiltersHaveEqualRipplesInBothBands) {
+    ResetHost();
+    for (const int32_t order : {2, 3, 6, 9}) {
+        const Cascade filter = Designed({Elliptic, order, Lowpass, 0.15, 0, 0.7, 48});
+        const auto extremes = [&](double from, double to) {
+            double least = 2, most = 0;
+            for (int k = 0; k <= 2000; ++k) {
+                const double gain = filter.gain(from + k / 2000.0 * (to - from));
+                least = std::min(least, gain);
+                most = std::max(most, gain);
+            }
+            return std::pair{20 * std::log10(least), 20 * std::log10(most)};
+        };
+        const auto [leastPassed, mostPassed] = extremes(0, 0.15);
+        EXPECT_NEAR(leastPassed, -0.7, 1e-9);
+        EXPECT_NEAR(mostPassed, 0.0, 1e-3);
+        double passes = 0.15, stops = 0.35; // the edge of the stop band by bisection
+        while (order > 2 && stops - passes > 1e-12) {
+            const double middle = (passes + stops) / 2;
+            (filter.decibels(middle) > -48 ? passes : stops) = middle;
+        }
+        EXPECT_NEAR(extremes(order > 2 ? stops : 0.45, 0.5).second, -48, 0.01) << order;
+    }
+}
+
+TEST(IIRDesign, IsStableUpToOrder40) {
+    ResetHost();
+    for (int family = BW; family <= Bessel; ++family)
+        for (int32_t type = Lowpass; type <= Bandstop; ++type)
+            for (const int32_t order : {1, 2, 3, 4, 5, 8, 13, 20, 27, 34, 39, 40}) {
+                Design design = {family, order, type};
+                design.form = 0;
+                const Cascade cascade = Designed(design);
+                for (std::size_t s = 0; s < cascade.sections(); ++s) {
+                    const double a0 = cascade.a[2 * s], a1 = cascade.a[2 * s + 1];
+                    ASSERT_TRUE(std::fabs(a1) < 1 && std::fabs(a0) < 1 + a1)
+                        << familyNames[static_cast<std::size_t>(family)] << type << " " << order;
+                }
+            }
+}
+
+TEST(IIRDesign, LaysOutItsSections) {
+    ResetHost();
+    // A real pole: (g (1 + z^-1) / (1 + g)) / (1 + (g - 1) / (g + 1) z^-1). Bessel has the same.
+    for (const int family : {BW, Bessel}) {
+        const Cascade one = Designed({family, 1, Lowpass});
+        const double g = std::tan(static_cast<double>(pi) * 0.1);
+        ASSERT_EQ(one.a.size(), 2U);
+        EXPECT_NEAR(one.a[0], (g - 1) / (g + 1), 1e-15);
+        EXPECT_NEAR(one.b[0], g / (1 + g), 1e-15);
+        EXPECT_EQ(one.b[1], one.b[0]);
+        EXPECT_TRUE(one.a[1] == 0 && one.b[2] == 0);
+    }
+    // It stands first: alone, before products of pairs, and as one that stays whole beside a 1.
+    Design odd = {BW, 5, Lowpass};
+    odd.form = 1;
+    const Cascade fourth = Designed(odd), second = Designed({BW, 5, Lowpass});
+    ASSERT_EQ(fourth.a.size(), 8U);
+    for (const std::size_t k : {1U, 2U, 3U})
+        EXPECT_TRUE(fourth.a[k] == 0 && fourth.b[k + 1] == 0);
+    EXPECT_EQ(fourth.a[0], second.a[0]);
+    EXPECT_NEAR(fourth.a[4], second.a[2] + second.a[4], 1e-15);
+    odd.type = Bandpass, odd.form = 0;
+    const Cascade split = Designed(odd);
+    ASSERT_EQ(split.a.size(), 12U);
+    EXPECT_EQ(std::vector<double>(split.a.begin() + 2, split.a.begin() + 4),
+              (std::vector<double>{0, 0}));
+    EXPECT_EQ(std::vector<double>(split.b.begin() + 3, split.b.begin() + 6),
+              (std::vector<double>{1, 0, 0}));
+    // What is asked for in the form that it comes in is not touched.
+    for (int32_t type = Lowpass; type <= Bandstop; ++type)
+        for (int family = BW; family <= Bessel; ++family) {
+            Design design = {family, 6, type};
+            const Cascade usual = Designed(design);
+            design.form = type >= Bandpass;
+            EXPECT_EQ(Designed(design).a, usual.a);
+            EXPECT_EQ(Designed(design).b, usual.b);
+        }
+}
+
+// Where the gain of filters of even order is below 1, in the middle of their band.
+TEST(IIRDesign, PutsTheGainIntoTheTellingSection) {
+    ResetHost();
+    const double center = std::atan(std::sqrt(std::tan(static_cast<double>(pi) * 0.1) *
+                                              std::tan(static_cast<double>(pi) * 0.23))) /
+                          static_cast<double>(pi);
+    const double middles[] = {0.0, 0.5, center, 0.0};
+    for (int32_t type = Lowpass; type <= Bandstop; ++type)
+        for (const int family : {Chebyshev, Elliptic})
+            for (const int32_t order : {5, 6}) {
+                const Cascade filter = Designed({family, order, type});
+                EXPECT_NEAR(filter.decibels(middles[type]), order == 6 ? -1.0 : 0.0, 1e-10);
+                const std::size_t last = filter.sections() - 1;
+                const std::size_t lower = family == Chebyshev && type >= Bandpass ? last : 0;
+                for (std::size_t s = 0; order == 6 && s <= last; ++s)
+                    EXPECT_NEAR(std::abs(filter.section(s, middles[type])),
+                                s == lower ? std::pow(10.0, -0.05) : 1.0, 1e-10)
+                        << family << type << s;
+            }
+}
+
+TEST(IIRDesign, TellsWhatCannotBeInOrder) {
+    ResetHost();
+    struct Case {
+        Design design;
+        ErrorCode code;
+    };
+    const int32_t most = std::numeric_limits<int32_t>::max();
+    std::vector<Case> cases;
+    for (int family = BW; family <= Bessel; ++family) {
+        for (const int32_t order : {0, -1, most, most - 1, -most - 1})
+            for (const int32_t type : {Lowpass, Bandpass})
+                cases.push_back({{family, order, type, -1}, ErrOrderNotPositive});
+        cases.insert(cases.end(),
+                     {
+                         {{family, 3, Lowpass, 0.0}, ErrBadCutoff},
+                         {{family, 3, Bandpass, 0.1, 0.0}, ErrBadCutoff},
+                         {{family, 3, Bandpass, 0.3, 0.3}, ErrBadCutoff},
+                         {{family, 3, Bandstop, 0.7, 0.6}, ErrBadCutoff},
+                         {{family, 3, Highpass, 0.5}, ErrBadCutoff},
+                         {{family, 3, Lowpass, 0.6}, ErrBadCutoff},
+                         {{family, 3, Bandpass, 0.1, 0.2, 1, 60, -1.0}, ErrBadCutoff},
+                         {{family, 3, Bandpass, 0.1, 0.6, family == Chebyshev ? -1.0 : 1.0},
+                          ErrAboveNyquist},
+                         {{family, 3, 4}, ErrInvalidSelector},
+                         {{family, 3, -1}, ErrInvalidSelector},
+                         {{family, 3, Lowpass, 0.1, 0.2, 1, 60, 1, 2}, ErrInvalidSelector},
+                         {{family, 3, Bandpass, 0.1, 0.2, 1, 60, 1, 2}, ErrInvalidSelector},
+                     });
+    }
+    const Case ofRipples[] = {
+        {{Chebyshev, 3, 7, 0.1, 0.2, 0.0}, ErrRippleNotPositive},
+        {{InvChebyshev, 3, 7, 0.1, 0.6, 1, 0.0}, ErrAttenuationNotPositive},
+        {{Elliptic, 3, Bandpass, 0.1, 0.6, 0.0, 0.0}, ErrAboveNyquist},
+        {{Elliptic, 3, 7, 0.1, 0.2, 0.0, 0.0}, ErrRippleNotPositive},
+        {{Elliptic, 3, 7, 0.1, 0.2, 1.0, 0.0}, ErrAttenuationNotPositive},
+        {{Elliptic, 3, 7, 0.1, 0.2, 3.0, 3.0}, ErrRippleAboveAttenuation},
+        {{Bessel, 200, Lowpass}, ErrBadCoefficients},
+    };
+    cases.insert(cases.end(), std::begin(ofRipples), std::end(ofRipples));
+    for (const auto &[design, code] : cases) {
+        const Cascade cascade = Designed(design);
+        EXPECT_EQ(cascade.err, code) << design.family << " " << design.order << " " << design.type;
+        EXPECT_TRUE(cascade.a.empty() && cascade.b.empty());
+    }
+    // The edge of a band may be half the sampling rate; NaN is no error.
+    EXPECT_EQ(Designed({BW, 3, Bandpass, 0.1, 0.5}).err, 0);
+    for (int family = BW; family <= Bessel; ++family)
+        for (const int32_t form : {0, 1}) {
+            const Cascade lost = Designed({family, 4, Bandpass, nan, 0.2, 1, 60, 1, form});
+            EXPECT_EQ(lost.err, 0);
+            EXPECT_TRUE(std::isnan(lost.a[0]) && std::isnan(lost.b[0]));
+        }
+}
+
+} // namespace
