@@ -1,10 +1,9 @@
 #include "filters/section_forms.h"
 
-#include "frame/constants.h"
 #include "poly/multiple_roots.h"
 #include "spectra/convolution.h"
 
-#include <cmath>
+#include <algorithm>
 
 namespace qx {
 
@@ -33,6 +32,7 @@ struct Factors {
     double re[2], modulus2[2];
     bool exist = false; // not if the degree is lower, or a coefficient NaN
 
+    // Conjugate roots come next to each other.
     ErrorCode find(double c0, const DBL *rest);
 
 private:
@@ -41,22 +41,6 @@ private:
         modulus2[which] = root.re * root.re + root.im * root.im;
     }
 };
-
-// The first root that belongs to another pair than root 0, of four. Roots of one modulus may come
-// in any order.
-int32_t OtherPair(const CDB *roots) {
-    int32_t partner = 1;
-    double least = kInfinity;
-    for (int32_t i = 1; i < 4; ++i) {
-        const double distance =
-            std::fabs(roots[i].re - roots[0].re) + std::fabs(roots[i].im + roots[0].im);
-        if (distance < least) {
-            least = distance;
-            partner = i;
-        }
-    }
-    return partner == 1 ? 2 : 1;
-}
 
 ErrorCode Factors::find(double c0, const DBL *rest) {
     const CDB polynomial[5] = {{c0, 0}, {rest[0], 0}, {rest[1], 0}, {rest[2], 0}, {rest[3], 0}};
@@ -73,7 +57,7 @@ ErrorCode Factors::find(double c0, const DBL *rest) {
     exist = degree >= 4;
     if (exist) {
         take(0, roots[0]);
-        take(1, roots[count == 1 ? 0 : count == 2 ? 1 : count == 3 ? 2 : OtherPair(roots)]);
+        take(1, roots[std::min(count - 1, 2)]);
     }
     return 0;
 }

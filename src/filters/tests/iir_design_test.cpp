@@ -1,5 +1,6 @@
 #include "qx/iir_design.h"
 
+#include "filters/section_forms.h"
 #include "qx/errors.h"
 #include "tests/support/hostile_host.h"
 #include "tests/support/table.h"
@@ -246,6 +247,30 @@ TEST(IIRDesign, LaysOutItsSections) {
             EXPECT_EQ(Designed(design).a, usual.a);
             EXPECT_EQ(Designed(design).b, usual.b);
         }
+}
+
+// Zeros on the unit circle have one modulus, so that their order says nothing of which are
+// conjugate.
+TEST(IIRDesign, SplitsSectionsBetweenConjugatePairs) {
+    for (double first = 0.1; first < 3; first += 0.17)
+        for (double second = 0.15; second < 3; second += 0.23) {
+            const double c[2] = {-2 * std::cos(first), -2 * std::cos(second)};
+            const double b[5] = {0.5, 0.5 * (c[0] + c[1]), 0.5 * (2 + c[0] * c[1]),
+                                 0.5 * (c[0] + c[1]), 0.5};
+            const double a[4] = {0.5 * (c[0] + c[1]), 0.25 * (2 + c[0] * c[1]),
+                                 0.125 * (c[0] + c[1]), 0.0625};
+            double splitA[4], splitB[6];
+            ASSERT_EQ(qx::FourthToSecondOrder({a, 4, b, 5, 1}, {splitA, 4, splitB, 6}), 0);
+            EXPECT_NEAR(splitB[1] * splitB[3] + splitB[0] * splitB[4], b[1], 1e-6);
+            EXPECT_NEAR(splitB[1] * splitB[4] + splitB[0] * splitB[5] + splitB[2] * splitB[3], b[2],
+                        1e-6);
+            EXPECT_NEAR(splitA[0] + splitA[2], a[0], 1e-6) << first << " " << second;
+            EXPECT_NEAR(splitA[1] * splitA[3], a[3], 1e-6);
+        }
+    const double a[4] = {}, b[5] = {};
+    double out[6];
+    EXPECT_EQ(qx::FourthToSecondOrder({a, 4, b, 4, 1}, {out, 4, out, 6}), ErrCoefficientSizes);
+    EXPECT_EQ(qx::SecondToFourthOrder({a, 4, b, 6, 0}, {out, 3, out, 5}), ErrCoefficientSizes);
 }
 
 // Where the gain of filters of even order is below 1, in the middle of their band.
