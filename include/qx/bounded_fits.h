@@ -28,7 +28,7 @@ QX_BEGIN_DECLS
     (lower or upper have one element, or they differ in length), ErrNaNInData (a bound is NaN),
     ErrFitPointsTooFew (fewer samples than free coefficients), ErrNonFiniteInput (a weight is NaN or
     infinite), ErrTooFewWeights (only one weight is not 0), ErrBoundsCrossed (a lower bound is above
-    its upper one). */
+    its upper one), ErrOutOfMemory (no memory where an input is y). */
 QX_API ErrorCode BoundLinearFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w,
                                      QX_IN DBL1D lower, QX_IN DBL1D upper, QX_OUT double *a,
                                      QX_OUT double *b, QX_OUT double *mse);
@@ -42,8 +42,8 @@ QX_API ErrorCode BoundLinearFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1
     not fit y), ErrNaNInData (a bound or a residual is NaN), ErrFitPointsTooFew (fewer samples than
     free coefficients), ErrNonFiniteInput (a weight is NaN or infinite), ErrTooFewWeights (only one
     weight is not 0), ErrBoundsCrossed (a lower bound is above its upper one), ErrOutOfMemory (no
-    memory), ErrIterationLimit (the limit is reached; all outputs are valid), WarnFitIncomplete
-    (lower or upper have one element, or they differ in length). */
+    memory), ErrIterationLimit (the limit is reached, or lines come back without rest; all outputs
+   are valid), WarnFitIncomplete (lower or upper have one element, or they differ in length). */
 QX_API ErrorCode BoundLinearFitLAR_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w,
                                         double tolerance, QX_INOUT int32_t *iterations,
                                         QX_IN DBL1D lower, QX_IN DBL1D upper, QX_OUT double *a,

@@ -172,20 +172,25 @@ def _rises_evenly(cells, decimal):
     return bool(steps.min() > 0 and steps.max() - steps.min() <= 0.01 * steps.max())
 
 
+def column_called(path, layout, column):
+    """The index of the column with a name, with or without its unit, or with a number from 1."""
+    if column in layout.names:
+        return layout.names.index(column)
+    bare = [re.sub(r"\s*[\[(].*", "", name) for name in layout.names]
+    if column in bare:
+        return bare.index(column)
+    if str(column).isdigit() and 1 <= int(column) <= layout.width:
+        return int(column) - 1
+    listed = ", ".join(repr(name) for name in layout.names if name) or "none of them has a name"
+    raise InputError(f"{path}: no column {column!r} among its {layout.width}: {listed}")
+
+
 def _column(path, reader, times, indices, column):
     """The index of the column to read: the chosen one, else the first of numbers that is neither time
     nor a count of the rows."""
     layout = reader.layout
     if column is not None:
-        if column in layout.names:
-            return layout.names.index(column)
-        bare = [re.sub(r"\s*[\[(].*", "", name) for name in layout.names]
-        if column in bare:
-            return bare.index(column)
-        if str(column).isdigit() and 1 <= int(column) <= layout.width:
-            return int(column) - 1
-        listed = ", ".join(repr(name) for name in layout.names if name) or "none of them has a name"
-        raise InputError(f"{path}: no column {column!r} among its {layout.width}: {listed}")
+        return column_called(path, layout, column)
     numeric = [c for c in range(layout.width) if not reader.is_clock(c) and any(
         tables.number(cell, layout.decimal) is not None for cell in layout.sample(c))]
     signals = [c for c in numeric if c not in times and c not in indices]

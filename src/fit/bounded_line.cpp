@@ -168,6 +168,10 @@ public:
             findLeverageFactors();
         Line last = *line;
         double lowest = Norm(samples_, last, method);
+        // A line follows from the one before, so lines that come back come back for ever (R. P.
+        // Brent, "An improved Monte Carlo factorization algorithm", 1980, finds them so).
+        Line earlier = last;
+        int32_t noted = 0;
         for (*rounds = 1; *rounds <= limit; ++*rounds) {
             if (const ErrorCode failed = findWeights(last, method))
                 return failed;
@@ -179,6 +183,12 @@ public:
             }
             if (isSettled(last, next, tolerance))
                 return 0;
+            if (next.slope == earlier.slope && next.intercept == earlier.intercept)
+                return ErrIterationLimit;
+            if (*rounds / 2 >= noted) {
+                earlier = next;
+                noted = *rounds;
+            }
             last = next;
         }
         *rounds = limit;

@@ -1,0 +1,55 @@
+"""The command fit."""
+
+import os
+
+METHODS = ("squares", "absolute", "bisquare")
+
+
+def values(texts):
+    """What NAME=NUMBER, as often as it was given, says of the parameters."""
+    said = {}
+    for text in texts:
+        name, _, value = text.partition("=")
+        try:
+            said[name.strip()] = float(value)
+        except ValueError:
+            raise ValueError(f"{text!r} is not NAME=NUMBER") from None
+    return said
+
+
+def fit(options):
+    from .. import fitting
+    model = fitting.model_of(options.model, options.order)
+    fixed = values(options.fix)
+    told = fitting.Options(METHODS.index(options.method), values(options.guess),
+                           {**values(options.lower), **fixed}, {**values(options.upper), **fixed})
+    columns = fitting.read(options.file, options.x, options.y, options.weights, options.decimal,
+                           options.missing)
+    result = fitting.fit(model, columns, told)
+    for line in fitting.lines(result):
+        print(line)
+    path = options.plot or os.path.join("out", "fit.svg")
+    fitting.plot(result, path)
+    print(f"Data, fit and residuals: {path}")
+
+
+def add(commands):
+    command = commands.add_parser("fit", help="fits a column of a text table against another")
+    command.add_argument("file")
+    command.add_argument("--model", required=True, metavar="MODEL",
+                         help="line, polynomial, exponential, power, logarithm or gaussian")
+    command.add_argument("--order", type=int, default=2, help="of a polynomial, 2 by default")
+    command.add_argument("--x", metavar="NAME", help="column, a name or a number; the first by default")
+    command.add_argument("--y", metavar="NAME", help="the first other column by default")
+    command.add_argument("--weights", metavar="NAME", help="column of weights; none by default")
+    command.add_argument("--method", choices=METHODS, default="squares",
+                         help="least squares, least absolute residuals, or bisquare weights, which "
+                              "leave out what lies far off")
+    for name, text in (("guess", "start value of a parameter"), ("lower", "least value of a parameter"),
+                       ("upper", "greatest value of a parameter"), ("fix", "value of a parameter")):
+        command.add_argument(f"--{name}", metavar="NAME=NUMBER", action="append", default=[],
+                             help=text + "; may be repeated")
+    command.add_argument("--decimal", choices=("point", "comma"), help="of the numbers in the table")
+    command.add_argument("--missing", choices=("skip",), help="leaves out rows with missing values")
+    command.add_argument("--plot", metavar="FILE", help="out/fit.svg by default; .png and .pdf, too")
+    command.set_defaults(run=fit)
