@@ -1,5 +1,8 @@
+#include "memory.h"
 #include "qx/host.h"
 
+#include <algorithm>
+#include <atomic>
 #include <cstddef>
 #include <cstdint>
 #include <cstdlib>
@@ -45,6 +48,26 @@ Front FrontOf(const void *block) {
     return front;
 }
 
+// Large blocks are promised only where the machine has the memory: otherwise the system gives out
+// more than there is, and ends some program, or stands still, when it is touched. What was promised
+// and is not yet touched still counts as available there, so the sum of the large blocks counts as
+// well.
+constexpr std::size_t largeFrom = std::size_t{256} << 20;
+constexpr uint64_t partKept = 16; // of the memory, for the work of the call and for others
+std::atomic<std::size_t> largeBlocks{0};
+
+bool TakeLarge(std::size_t size) {
+    const qx::host::Memory memory = qx::host::PhysicalMemory();
+    const uint64_t kept = memory.total / partKept;
+    const uint64_t all = largeBlocks.fetch_add(size, std::memory_order_relaxed) + size;
+    if (all <= memory.total - kept && size <= memory.available - std::min(kept, memory.available))
+        return true;
+    largeBlocks.fetch_sub(size, std::memory_order_relaxed);
+    return false;
+}
+
+void GiveLarge(std::size_t size) { largeBlocks.fetch_sub(size, std::memory_order_relaxed); }
+
 // The address of the dimension fields of a block for so many elements, or null.
 void *NewBlock(int32_t numDims, uint64_t count, std::size_t elementSize, bool cleared) {
     const std::size_t fields = FieldsSize(numDims);
@@ -52,9 +75,15 @@ void *NewBlock(int32_t numDims, uint64_t count, std::size_t elementSize, bool cl
     if (count > (PTRDIFF_MAX - overhead) / elementSize)
         return nullptr;
     const std::size_t size = static_cast<std::size_t>(count) * elementSize;
-    void *memory = cleared ? std::calloc(1, overhead + size) : std::malloc(overhead + size);
-    if (memory == nullptr)
+    const bool isLarge = fields + size >= largeFrom;
+    if (isLarge && !TakeLarge(fields + size))
         return nullptr;
+    void *memory = cleared ? std::calloc(1, overhead + size) : std::malloc(overhead + size);
+    if (memory == nullptr) {
+        if (isLarge)
+            GiveLarge(fields + size);
+        return nullptr;
+    }
     const auto start = reinterpret_cast<uintptr_t>(memory) + sizeof(Front) + fields;
     const uintptr_t elements = (start + elementAlignment - 1) / elementAlignment * elementAlignment;
     char *block =
@@ -64,7 +93,12 @@ void *NewBlock(int32_t numDims, uint64_t count, std::size_t elementSize, bool cl
     return block;
 }
 
-void FreeBlock(void *block) { std::free(FrontOf(block).memory); }
+void FreeBlock(void *block) {
+    const Front front = FrontOf(block);
+    std::free(front.memory);
+    if (front.capacity >= largeFrom)
+        GiveLarge(front.capacity);
+}
 
 void *NewArray(int32_t numDims, std::size_t elementSize, const int32_t *sizes,
                const void *elements) {

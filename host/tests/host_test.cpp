@@ -10,6 +10,10 @@
 #include <thread>
 #include <vector>
 
+#ifdef __linux__
+#include <unistd.h>
+#endif
+
 namespace {
 
 using qx::host::Array1D;
@@ -47,6 +51,29 @@ TEST(Blocks, KeepTheirElementsThroughGrowthAndShrinking) {
     }
     QXHostFree(nullptr);
 }
+
+#if defined(__linux__) && !defined(__SANITIZE_ADDRESS__) && !defined(__SANITIZE_THREAD__)
+TEST(Blocks, PromiseNoMoreThanTheMachineHas) {
+    const auto total = static_cast<uint64_t>(sysconf(_SC_PHYS_PAGES)) *
+                       static_cast<uint64_t>(sysconf(_SC_PAGESIZE));
+    std::vector<void *> taken; // and never touched
+    while (void *array = QXHostNew1D(QXTypeU8, INT32_MAX))
+        taken.push_back(array);
+    EXPECT_LT(taken.size() * uint64_t{INT32_MAX}, total);
+    auto *small = static_cast<Array1DHandle>(QXHostNew1D(QXTypeU8, 1000));
+    ASSERT_NE(small, nullptr);
+    const void *const before = *small;
+    EXPECT_EQ(HostBlockReshape(QXTypeCDB, 1, &small, INT32_MAX), QXHostNoMemory);
+    EXPECT_EQ(*small, before);
+    for (void *array : taken)
+        QXHostFree(array);
+    if (!taken.empty()) {
+        EXPECT_EQ(HostBlockReshape(QXTypeU8, 1, &small, INT32_MAX), QXHostDone);
+        EXPECT_EQ(HostBlockReshape(QXTypeU8, 1, &small, 10), QXHostDone);
+    }
+    QXHostFree(small);
+}
+#endif
 
 TEST(Blocks, GiveMemoryBackWhereItIsWorthAMove) {
     auto *array = static_cast<Array1DHandle>(QXHostNew1D(QXTypeDBL, 10000));

@@ -15,7 +15,7 @@ from .library import library
 
 KEPT_PER_THREAD = 64
 
-_caches = weakref.WeakSet()
+_caches: "weakref.WeakSet[Cache]" = weakref.WeakSet()
 
 
 class Word:
