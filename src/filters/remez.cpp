@@ -195,34 +195,17 @@ ErrorCode Exchange::prepare() {
     return 0;
 }
 
-// The products of some hundred distances leave the range of a double. So powers of 2 are taken out
-// on the way, and all weights get one power in common, which cancels where they are used.
+// All weights get one power of 2 in common, which cancels where they are used.
 ErrorCode Exchange::formWeights() {
-    constexpr int32_t step = 512;
-    constexpr double large = 0x1p512, small = 0x1p-512;
+    MultiplyDistances(x_.data(), r_, ad_.data(), exponent_.data());
     int32_t least = 0;
     for (int32_t j = 0; j < r_; ++j) {
-        double product = 1.0;
-        int32_t exponent = 0;
-        for (int32_t k = 0; k < r_; ++k) {
-            if (k != j)
-                product *= x_[j] - x_[k];
-            if (std::fabs(product) < small) {
-                product *= large;
-                exponent -= step;
-            } else if (std::fabs(product) > large) {
-                product *= small;
-                exponent += step;
-            }
-        }
-        if (product == 0.0)
+        if (ad_[j] == 0.0)
             return ErrBadDesignField;
-        ad_[j] = 1.0 / product;
-        exponent_[j] = exponent;
-        least = std::min(least, exponent);
+        least = exponent_[j] < least ? exponent_[j] : least;
     }
     for (int32_t j = 0; j < r_; ++j)
-        ad_[j] = std::ldexp(ad_[j], least - exponent_[j]);
+        ad_[j] = std::ldexp(1.0 / ad_[j], least - exponent_[j]);
     return 0;
 }
 
@@ -255,8 +238,9 @@ double Exchange::at(double x) const {
     for (int32_t j = 0; j < r_; ++j)
         if (x == x_[j])
             return y_[j];
-    const double places[interpolationGroup] = {x, x, x, x};
-    double values[interpolationGroup];
+    double places[interpolationGroup], values[interpolationGroup];
+    for (double &place : places)
+        place = x;
     Interpolate(polynomial(), places, values);
     return values[0];
 }

@@ -39,11 +39,16 @@ struct Interpolation {
 };
 
 // Points that are evaluated at once.
-constexpr int32_t interpolationGroup = 4;
+constexpr int32_t interpolationGroup = 8;
 
 // Its values at a group of places: the sum over j of c y[j] by the sum of c, c = ad[j] / (place -
 // x[j]), both in this order, the second one compensated. At x[j] itself it is NaN.
 QX_BY_WIDTH(void, Interpolate, (const Interpolation &polynomial, const DBL *places, DBL *values))
+
+// The products of x[j] - x[k] over the other k in ascending order, for each j. As the products of
+// some hundred distances leave the range of a double, product[j] is to be multiplied by
+// 2^exponent[j].
+QX_BY_WIDTH(void, MultiplyDistances, (const DBL *x, int32_t count, DBL *product, I32 *exponent))
 
 } // namespace qx
 

@@ -30,7 +30,59 @@ QX_INLINE void InterpolateIn(const Interpolation &polynomial, const DBL *places,
         (above[i] / below[i]).store(values + i * nativeLanes);
 }
 
+// The factors between two looks at the range: distances of cosines on the grid are above 1e-9.
+constexpr int32_t factorsAtOnce = 16;
+
+QX_INLINE void KeepInRange(DBL &product, I32 &exponent) {
+    if (product > -0x1p-512 && product < 0x1p-512) {
+        product *= 0x1p512;
+        exponent -= 512;
+    } else if (product > 0x1p512 || product < -0x1p512) {
+        product *= 0x1p-512;
+        exponent += 512;
+    }
+}
+
+template <class L>
+QX_INLINE L WithOne(L lanes, int lane) {
+    double values[L::count];
+    lanes.store(values);
+    values[lane] = 1.0;
+    return L::load(values);
+}
+
+template <class L>
+QX_INLINE void MultiplyDistancesOf(int32_t j, const DBL *x, int32_t count, DBL *product,
+                                   I32 *exponent) {
+    const L own = L::load(x + j);
+    for (int lane = 0; lane < L::count; ++lane) {
+        product[j + lane] = 1.0;
+        exponent[j + lane] = 0;
+    }
+    for (int32_t first = 0; first < count; first += factorsAtOnce) {
+        L part = L::load(product + j);
+        const int32_t end = first + factorsAtOnce < count ? first + factorsAtOnce : count;
+        for (int32_t k = first; k < end; ++k) {
+            L distance = own - L(x[k]);
+            if (k >= j && k < j + L::count) // the distance of one lane from itself
+                distance = WithOne(distance, k - j);
+            part = part * distance;
+        }
+        part.store(product + j);
+        for (int lane = 0; lane < L::count; ++lane)
+            KeepInRange(product[j + lane], exponent[j + lane]);
+    }
+}
+
 } // namespace
+
+void MultiplyDistances(const DBL *x, int32_t count, DBL *product, I32 *exponent) {
+    int32_t j = 0;
+    for (; j + nativeLanes <= count; j += nativeLanes)
+        MultiplyDistancesOf<Lanes<nativeLanes>>(j, x, count, product, exponent);
+    for (; j < count; ++j)
+        MultiplyDistancesOf<Lanes<1>>(j, x, count, product, exponent);
+}
 
 void Interpolate(const Interpolation &polynomial, const DBL *places, DBL *values) {
     static_assert(interpolationGroup % nativeLanes == 0);
