@@ -280,6 +280,7 @@ def _decades(axes, values):
     top = values.max()
     if top > 0 and math.isfinite(top):
         axes.set_yscale("log")
+        axes.yaxis.set_major_formatter(lambda value, _: f"{value:g}")  # as text, not as a formula
         positive = values[values > 1e-12 * top]
         axes.set_ylim(max(positive.min(), 1e-2 * np.median(positive)) / 1.5, 1.6 * top)
 
@@ -342,9 +343,10 @@ def power(recording):
 
 
 # Families with sections of their own; they take the above from here.
+from .sections_cleaning import cleaned  # noqa: E402
 from .sections_filtering import filtered  # noqa: E402
 
-SECTIONS = [overview, statistics, histogram, amplitudes, power, filtered]
+SECTIONS = [overview, statistics, histogram, amplitudes, power, filtered, cleaned]
 
 
 # Output

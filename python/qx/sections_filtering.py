@@ -1,7 +1,5 @@
 """The section of the report that shows a recording before and after a filter."""
 
-import math
-
 import numpy as np
 
 from . import report
@@ -11,24 +9,11 @@ CUTOFF = 0.1  # cycles per sample
 SHOWN = 1000  # samples
 
 
-def smoothing_sections(cutoff):
-    """A fourth-order Butterworth low-pass as two sections of second order, (a, b), by the bilinear
-    transform of its two pairs of poles."""
-    warped = math.tan(math.pi * cutoff)
-    a, b = [], []
-    for angle in (math.pi / 8, 3 * math.pi / 8):
-        damping = 2 * math.cos(angle) * warped
-        scale = 1 + damping + warped**2
-        a += [2 * (warped**2 - 1) / scale, (1 - damping + warped**2) / scale]
-        b += [warped**2 / scale, 2 * warped**2 / scale, warped**2 / scale]
-    return a, b
-
-
 def smoothed(values):
     """The values through the low-pass, forward and backward. The ends meet zeros, so the mean goes
     around the filter."""
     mean = call("Mean_head", values)
-    a, b = smoothing_sections(CUTOFF)
+    a, b = call("BWCoefs", 1.0, CUTOFF, 0.0, 4, 0)
     return mean + call("zeroPhaseCascadeFiltH", values - mean, 0, a, b, [], [], 0)[0]
 
 
@@ -51,7 +36,7 @@ def filtered(recording):
     axes.set(title=f"{len(after[part])} samples from the middle, before and after the filter",
              xlabel=f"Time ({recording.time_unit})", ylabel=report.quantity(recording))
     axes.margins(x=0.005)
-    rows = [report.Row("Half power, of one pass, at", report.number(CUTOFF * scale, 4), unit, "design"),
+    rows = [report.Row("Half power, of one pass, at", report.number(CUTOFF * scale, 4), unit, "BWCoefs"),
             report.Row("RMS of what is left, without the mean",
                        report.number(call("RMS_head", after - call("Mean_head", after))),
                        recording.unit, "zeroPhaseCascadeFiltH, RMS_head"),

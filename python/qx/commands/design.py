@@ -1,0 +1,81 @@
+"""The command design."""
+
+import argparse
+import json
+import os
+
+from .values import positive
+
+EXAMPLES = """\
+examples:
+  qx design butterworth lowpass 40 --rate 360 --order 4
+  qx design elliptic bandstop 48 52 --rate 1000 --order 3 --ripple 0.5 --attenuation 40
+  qx design equiripple bandpass 900 1000 2000 2100 --rate 8000 --taps 121 --weight 10
+  qx design windowed highpass 0.5 --rate 100 --taps 401 --window hamming
+  qx design narrow lowpass 20 25 --rate 8000 --ripple 0.1 --attenuation 60
+
+edges: one of a lowpass or highpass, two of a bandpass or bandstop; of equiripple and narrow filters
+the edges of pass and stop bands, twice as many, in ascending order."""
+
+
+def made(options):
+    """The Filter, and what of it a program reads."""
+    from .. import design
+    kind, edges, rate = options.type, sorted(options.edges), options.rate
+    if options.family in design.FAMILIES:
+        form = design.FOURTH_ORDER if options.fourth else design.SECOND_ORDER
+        a, b, filter_ = design.iir(options.family, kind, edges, rate, options.order, options.ripple,
+                                   options.attenuation, form)
+        return filter_, {"form": form, "a": list(a), "b": list(b)}
+    if options.family == "windowed":
+        filter_ = design.windowed(kind, edges, rate, options.taps, options.window)
+    elif options.family == "equiripple":
+        filter_ = design.equiripple(kind, edges, rate, options.taps, options.weight)
+    else:
+        stages, filter_ = design.narrow(kind, edges, rate, options.ripple, options.attenuation)
+        return filter_, {name: list(value) if name in ("model", "interpolator") else value
+                         for name, value in stages.items()}
+    return filter_, {"taps": list(filter_.sections[0][0])}
+
+
+def design_filter(options):
+    from .. import design_page
+    filter_, coefficients = made(options)
+    title = f"{options.family.capitalize().replace('-', ' ')} {options.type}"
+    edges = ", ".join(f"{edge:g}" for edge in sorted(options.edges))
+    page = os.path.join(options.output, "design.html")
+    numbers = os.path.join(options.output, "design.json")
+    for line in design_page.write(filter_, f"{title}, {edges} of {options.rate:g}", options.rate, page):
+        print(line)
+    with open(numbers, "w", encoding="utf-8") as file:
+        json.dump({"family": options.family, "type": options.type, "rate": options.rate,
+                   "edges": sorted(options.edges), "export": filter_.export, **coefficients}, file,
+                  indent=1)
+        file.write("\n")
+    print(f"\nMagnitude, phase and group delay: {page}\nCoefficients: {numbers}")
+
+
+def add(commands):
+    command = commands.add_parser(
+        "design", help="designs a filter and plots what it does", epilog=EXAMPLES,
+        formatter_class=argparse.RawDescriptionHelpFormatter)
+    command.add_argument("family", choices=["butterworth", "chebyshev", "inverse-chebyshev", "elliptic",
+                                            "bessel", "windowed", "equiripple", "narrow"])
+    command.add_argument("type", choices=["lowpass", "highpass", "bandpass", "bandstop"])
+    command.add_argument("edges", type=positive, nargs="+", metavar="EDGE")
+    command.add_argument("--rate", type=positive, default=1.0, metavar="HZ",
+                         help="samples per second (edges are in its unit); 1 if it is not given")
+    command.add_argument("--order", type=int, default=4, help="of the lowpass behind an IIR filter (4)")
+    command.add_argument("--ripple", type=positive, default=1.0, metavar="DB",
+                         help="of the pass band (1 dB)")
+    command.add_argument("--attenuation", type=positive, default=60.0, metavar="DB",
+                         help="of the stop band (60 dB)")
+    command.add_argument("--fourth", action="store_true",
+                         help="sections of fourth order in place of second")
+    command.add_argument("--taps", type=int, default=101, help="of windowed and equiripple filters (101)")
+    command.add_argument("--window", choices=["hanning", "hamming", "blackman"],
+                         help="of windowed filters; without one the response is cut off")
+    command.add_argument("--weight", type=positive, default=1.0, metavar="W",
+                         help="of a deviation in the stop band of equiripple filters (1)")
+    command.add_argument("--output", default="out", metavar="FOLDER", help="for the page and the numbers")
+    command.set_defaults(run=design_filter)
