@@ -542,34 +542,95 @@ TEST(LinearFits, ChecksOfPolynomials) {
 
 // Robust norms.
 
+// K. A. Brownlee, "Statistical theory and methodology in science and engineering", 1965: three
+// predictors and the loss.
+const Samples stackLoss = {80, 27, 89, 42, 80, 27, 88, 37, 75, 25, 90, 37, 62, 24, 87, 28, 62,
+                           22, 87, 18, 62, 23, 87, 18, 62, 24, 93, 19, 62, 24, 93, 20, 58, 23,
+                           87, 15, 58, 18, 80, 14, 58, 18, 89, 14, 58, 17, 88, 13, 58, 18, 82,
+                           11, 58, 19, 93, 12, 50, 18, 89, 8,  50, 18, 86, 7,  50, 19, 72, 8,
+                           50, 19, 79, 8,  50, 20, 80, 9,  56, 20, 82, 15, 70, 20, 91, 15};
+constexpr int32_t stackDays = 21;
+
+void WriteStackLoss(const qx::RowBlock &block) {
+    for (int32_t i = 0; i < block.count; ++i) {
+        block.column(0)[i] = 1.0;
+        for (int32_t j = 0; j < 4; ++j)
+            block.column(j + 1)[i] = stackLoss[4 * (block.first + i) + j];
+    }
+}
+Samples ResidualsOfStackLoss(const double *c) {
+    Samples rest;
+    for (int i = 0; i < stackDays; ++i) {
+        const double *const day = &stackLoss[4 * i];
+        rest.push_back(day[3] - c[0] - c[1] * day[0] - c[2] * day[1] - c[3] * day[2]);
+    }
+    return rest;
+}
+Samples FitStackLoss(qx::FitNorm norm, const Samples &w = {}) {
+    const auto rows = [](const qx::RowBlock &block) { WriteStackLoss(block); };
+    const DBLArray weights(w), c({0, 0, 0, 0});
+    EXPECT_EQ(qx::SolveRobustly({rows, stackDays, 4, w.empty() ? nullptr : weights.data()}, norm,
+                                {1e-10, 0.0, qx::robustIterations}, c.data()),
+              0);
+    return c.values();
+}
+
 TEST(LinearFits, LeastAbsoluteResidualsOfTheStackLoss) {
-    // K. A. Brownlee, "Statistical theory and methodology in science and engineering", 1965.
-    const Samples data = {80, 27, 89, 42, 80, 27, 88, 37, 75, 25, 90, 37, 62, 24, 87, 28, 62,
-                          22, 87, 18, 62, 23, 87, 18, 62, 24, 93, 19, 62, 24, 93, 20, 58, 23,
-                          87, 15, 58, 18, 80, 14, 58, 18, 89, 14, 58, 17, 88, 13, 58, 18, 82,
-                          11, 58, 19, 93, 12, 50, 18, 89, 8,  50, 18, 86, 7,  50, 19, 72, 8,
-                          50, 19, 79, 8,  50, 20, 80, 9,  56, 20, 82, 15, 70, 20, 91, 15};
-    const auto rows = [&](const qx::RowBlock &block) {
-        for (int32_t i = 0; i < block.count; ++i) {
-            block.column(0)[i] = 1.0;
-            for (int32_t j = 0; j < 4; ++j)
-                block.column(j + 1)[i] = data[4 * (block.first + i) + j];
-        }
-    };
-    const auto sumAt = [&](const double *c) {
+    const auto sumAt = [](const Samples &c) {
         double sum = 0.0;
-        for (int i = 0; i < 21; ++i)
-            sum += std::fabs(data[4 * i + 3] - c[0] - c[1] * data[4 * i] - c[2] * data[4 * i + 1] -
-                             c[3] * data[4 * i + 2]);
+        for (const double rest : ResidualsOfStackLoss(c.data()))
+            sum += std::fabs(rest);
         return sum;
     };
-    double c[4];
-    ASSERT_EQ(qx::SolveRobustly({rows, 21, 4, nullptr}, qx::leastAbsolute, {1e-9, 0.0, 500}, c), 0);
     // The minimum, by linear programming.
-    const double best[4] = {-39.68985507, 0.83188406, 0.57391304, -0.06086957};
-    EXPECT_LT(sumAt(c), sumAt(best) * 1.001);
+    const Samples best = {-39.68985507, 0.83188406, 0.57391304, -0.06086957};
+    const Samples found = FitStackLoss(qx::leastAbsolute);
+    EXPECT_LT(sumAt(found), sumAt(best) * 1.0006);
     for (int j = 0; j < 4; ++j)
-        EXPECT_NEAR(c[j], best[j], 0.02 * std::fabs(best[j]));
+        EXPECT_NEAR(found[j], best[j], 0.02 * std::fabs(best[j]));
+}
+
+double MedianOf(Samples values) {
+    std::sort(values.begin(), values.end());
+    return values[values.size() / 2];
+}
+
+// Where it ends, the solution is that of the biweights that its own residuals give.
+TEST(LinearFits, BisquareFitOfTheStackLossIsAFixedPoint) {
+    Rows rows;
+    Samples loss, some;
+    for (int i = 0; i < stackDays; ++i) {
+        const double *const day = &stackLoss[4 * i];
+        rows.push_back({1.0, day[0], day[1], day[2]});
+        loss.push_back(day[3]);
+        some.push_back(i % 3 + 0.5);
+    }
+    for (const Samples &w : {Samples(), some}) {
+        const Solution plain = SolveNormal(rows, loss, w);
+        const Samples found = FitStackLoss(qx::bisquare, w);
+        Samples adjusted = ResidualsOfStackLoss(found.data()), distances;
+        for (int i = 0; i < stackDays; ++i) {
+            Long leverage = 0;
+            for (int j = 0; j < 4; ++j)
+                for (int l = 0; l < 4; ++l)
+                    leverage += rows[i][j] * plain.covariance[j][l] * rows[i][l];
+            const double weight = w.empty() ? 1.0 : w[i];
+            adjusted[i] *= static_cast<double>(std::sqrt(weight / (1 - weight * leverage)));
+        }
+        for (const double value : adjusted)
+            distances.push_back(std::fabs(value - MedianOf(adjusted)));
+        const double scale = MedianOf(distances) / 0.6745;
+        Samples weights;
+        for (int i = 0; i < stackDays; ++i) {
+            const double q = adjusted[i] / (4.685 * scale);
+            weights.push_back((w.empty() ? 1.0 : w[i]) *
+                              (std::fabs(q) < 1 ? std::pow(1 - q * q, 2) : 0.0));
+        }
+        const Solution expected = SolveNormal(rows, loss, weights);
+        for (int j = 0; j < 4; ++j)
+            EXPECT_NEAR(found[j], static_cast<double>(expected.c[j]), 1e-7);
+        EXPECT_GT(std::fabs(found[0] - static_cast<double>(plain.c[0])), 1.0);
+    }
 }
 
 TEST(LinearFits, RobustPolynomialsIgnoreOutliers) {

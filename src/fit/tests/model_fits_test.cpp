@@ -236,6 +236,17 @@ TEST(ModelFits, LimitsOfGaussNewton) {
               FitExp(x, y, {.tolerance = 0.0001}).iterations);
     EXPECT_EQ(FitExp(x, y, {.tolerance = 0.0}).p, FitExp(x, y, {.tolerance = -1.0}).p);
 
+    // Steps that lead away are allowed in the first tenth of the limit only: on this way to the
+    // minimum there are some.
+    Samples stairs(40, 0.0);
+    for (int i = 0; i < 20; ++i)
+        stairs[i] = 1.0;
+    const Fitted early = FitExp(x, stairs, {.guess = {0.5, 2.0}, .iterations = 20});
+    const Fitted late = FitExp(x, stairs, {.guess = {0.5, 2.0}, .iterations = 100});
+    EXPECT_LT(early.iterations, 10);
+    EXPECT_GT(early.mse, 0.13);
+    EXPECT_LT(late.mse, 0.09);
+
     // Where a step leads away, the best parameters return.
     const Samples wild = {1.0, 5.0};
     const Fitted astray = FitExp(x, y, {.guess = wild, .iterations = 0});
@@ -356,6 +367,10 @@ TEST(ModelFits, GaussianPeaksAreLeastSquares) {
             EXPECT_NEAR(found.p[2], 0.9, 0.1);
             ExpectMinimum(Peak, x, y, weights, found, 1e-5);
         }
+    // Where no trial is better the parameters stay, to the bit.
+    const Samples z = Values(Peak, {2.0, 0.8, 0.9}, x, 0.05);
+    const Samples best = FitPeak(x, z, {.iterations = 5000}).p;
+    EXPECT_EQ(FitPeak(x, z, {.guess = best, .iterations = 0}).p, best);
     // A negative deviation is the same peak.
     const Samples y = Values(Peak, {2.0, 0.8, 0.9}, x, 0.05);
     EXPECT_EQ(FitPeak(x, y, {.guess = {2, 1, -1}}).p, FitPeak(x, y, {.guess = {2, 1, 1}}).p);
