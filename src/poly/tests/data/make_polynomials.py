@@ -1,5 +1,5 @@
 #!/usr/bin/python3
-"""Writes data/polynomials.dat: polynomials with coefficients in double and their roots to 50 digits
+"""Writes polynomials.dat: polynomials with coefficients in double and their roots to 50 digits
 (mpmath), rounded. A line: NAME DEGREE, the coefficients from the constant term on, and for each root
 its condition number, by how much it changes for a relative change of all coefficients. Numbers are
 hex floats; coefficients and roots have a real and an imaginary part."""
@@ -61,7 +61,6 @@ def line(name, coefficients):
 
 
 if __name__ == "__main__":
-    data = Path(__file__).parent / "data"
-    data.mkdir(exist_ok=True)
+    data = Path(__file__).parent
     (data / "polynomials.dat").write_text(
         "".join(line(name, a) + "\n" for name, a in polynomials()))

@@ -1,0 +1,1 @@
+qx_bench(poly SOURCES poly.cpp PEERS gsl)

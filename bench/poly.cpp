@@ -1,0 +1,122 @@
+// Roots of polynomials.
+//
+// bench_poly. Peer: gsl_poly_complex_solve, all roots of a real polynomial as eigenvalues of its
+// balanced companion matrix.
+
+#include "bench/timing.h"
+#include "poly/complex_roots.h"
+#include "poly/multiple_roots.h"
+
+#include <cstdint>
+#include <random>
+#include <string>
+#include <vector>
+
+#ifdef QX_PEER_GSL
+#include <gsl/gsl_errno.h>
+#include <gsl/gsl_poly.h>
+#endif
+
+namespace {
+
+using qx::bench::Keep;
+using qx::bench::MedianTimes;
+using qx::bench::Ratios;
+
+std::vector<double> FromRoots(const std::vector<double> &roots) {
+    std::vector<double> a = {1.0};
+    for (const double root : roots) {
+        a.insert(a.begin(), 0.0);
+        for (std::size_t k = 0; k + 1 < a.size(); ++k)
+            a[k] -= root * a[k + 1];
+    }
+    return a;
+}
+
+struct Kind {
+    const char *name;
+    std::vector<double> (*coefficients)(int32_t degree);
+};
+const Kind kinds[] = {
+    {"random",
+     [](int32_t degree) {
+         std::mt19937_64 random(static_cast<uint64_t>(degree));
+         std::vector<double> a;
+         for (int32_t k = 0; k <= degree; ++k)
+             a.push_back(static_cast<double>(random() >> 11) * 0x1p-52 - 1.0);
+         return a;
+     }},
+    {"on a line",
+     [](int32_t degree) {
+         std::vector<double> roots;
+         for (int32_t k = 0; k < degree; ++k)
+             roots.push_back((k + 0.5) / degree);
+         return FromRoots(roots);
+     }},
+    {"threefold",
+     [](int32_t degree) {
+         std::vector<double> roots;
+         for (int32_t k = 0; k < degree; ++k)
+             roots.push_back(1.0 + k / 3);
+         return FromRoots(roots);
+     }},
+};
+
+double PeerSeconds([[maybe_unused]] const std::vector<double> &a) {
+#ifdef QX_PEER_GSL
+    gsl_set_error_handler_off();
+    gsl_poly_complex_workspace *const work = gsl_poly_complex_workspace_alloc(a.size());
+    std::vector<double> roots(2 * a.size());
+    const auto times = MedianTimes([&] {
+        gsl_poly_complex_solve(a.data(), a.size(), work, roots.data());
+        Keep(roots[0]);
+    });
+    gsl_poly_complex_workspace_free(work);
+    return times[0];
+#else
+    return 0;
+#endif
+}
+
+} // namespace
+
+int main() {
+    Ratios search("all roots by Newton's method"), multiple("roots with multiplicities");
+    for (const Kind &kind : kinds) {
+        for (const int32_t degree : {3, 6, 12, 24, 48, 96}) {
+            if (degree > 24 && std::string(kind.name) != "random")
+                continue; // coefficients in double tell no roots there
+            const std::vector<double> a = kind.coefficients(degree);
+            const auto n = static_cast<int32_t>(a.size());
+            std::vector<CDB> coefficients, roots(a.size()), simple(a.size());
+            for (const double value : a)
+                coefficients.push_back({value, 0.0});
+            std::vector<int32_t> times(a.size());
+            int32_t count = 0, otherCount = 0;
+            const auto seconds = MedianTimes(
+                [&] {
+                    qx::CxPolynomialRoots(coefficients.data(), n, 100, roots.data(), &count);
+                    Keep(roots[0]);
+                },
+                [&] {
+                    qx::MultipleRootsComplex(coefficients.data(), n, 1, 0.0, roots.data(), &count,
+                                             simple.data(), times.data(), &otherCount);
+                    Keep(roots[0]);
+                });
+            const double peer = PeerSeconds(a);
+            std::printf("%-10s degree %3d  search %10.2f us %s  multiple %10.2f us %s\n", kind.name,
+                        degree, seconds[0] * 1e6,
+                        qx::bench::Cell(peer > 0 ? seconds[0] / peer : 0).c_str(), seconds[1] * 1e6,
+                        qx::bench::Cell(peer > 0 ? seconds[1] / peer : 0).c_str());
+            if (peer > 0) {
+                const std::string name =
+                    std::string(kind.name) + ", degree " + std::to_string(degree);
+                search.add(seconds[0] / peer, name);
+                multiple.add(seconds[1] / peer, name);
+            }
+        }
+    }
+    search.summary("GSL, eigenvalues");
+    multiple.summary("GSL, eigenvalues, without multiplicities");
+    return 0;
+}
