@@ -14,6 +14,10 @@ PrimeFactor PrimeAt(const FFTPlan &plan, int32_t level) {
     return {plan.factors[level], plan.kinds[level], plan.stages[level]};
 }
 
+bool IsInterleaved(const DBL *re, const DBL *im, ptrdiff_t stride) {
+    return im == re + 1 && stride == 2;
+}
+
 // Complex data at any strides, real and imaginary parts in arrays of their own.
 struct ComplexData {
     const DBL *inRe, *inIm;
@@ -68,7 +72,7 @@ struct RealData {
             return PrimeRealTwiddle(PrimeAt(plan, level), out, outStride, m, work);
         const FFTStage &stage = *plan.stages[level];
         if (outStride == 1)
-            stage.kernels->realLanesTwiddle(out, stage, m);
+            stage.kernels->realLanesTwiddle(out, m, out, stage, m);
         else
             plan.realTwiddle[level](out, stage.twiddleCos, stage.twiddleSin, outStride, m);
     }
@@ -99,58 +103,126 @@ struct Bundle {
     ptrdiff_t outStride; // from the results of one to those of the next
 };
 
-// What differs between complex and real data.
+// What differs between complex and real data. The stage takes blocks `inLeg` apart and leaves its
+// results side by side.
 struct ComplexLanesPath {
     static constexpr ptrdiff_t width = 2; // DBL units of one value
+    static bool gainsByBuffer(int32_t, int32_t) { return true; }
     static void leaf(const KernelSet &kernels, const DBL *in, DBL *out,
                      const LeafColumns &columns) {
         kernels.complexLanesLeaf(in, out, columns);
     }
-    static void twiddle(const FFTPlan &plan, int32_t level, DBL *out, int32_t m, DBL *work) {
-        if (plan.kinds[level] != KernelFactor)
-            return PrimeComplexTwiddle(PrimeAt(plan, level), out, out + 1, 2, m, work);
-        const FFTStage &stage = *plan.stages[level];
-        stage.kernels->complexLanesTwiddle(out, stage, m);
+    static void twiddle(const FFTStage &stage, const DBL *in, ptrdiff_t inLeg, DBL *out,
+                        int32_t m) {
+        stage.kernels->complexLanesTwiddle(in, inLeg, out, stage, m);
+    }
+    static void primeTwiddle(const PrimeFactor &factor, DBL *out, int32_t m, DBL *work) {
+        PrimeComplexTwiddle(factor, out, out + 1, 2, m, work);
     }
 };
 struct RealLanesPath {
     static constexpr ptrdiff_t width = 1;
+    // Only where the columns are copied in any case. Two places double the addresses of a stage,
+    // which reads from two ends of each block: 10^3 to 10^5 took 1.15 to 1.3 times as long.
+    static bool gainsByBuffer(int32_t p, int32_t m) { return p > 4 && m % 256 == 0; }
     static void leaf(const KernelSet &kernels, const DBL *in, DBL *out,
                      const LeafColumns &columns) {
         kernels.realLanesLeaf(in, out, columns);
     }
-    static void twiddle(const FFTPlan &plan, int32_t level, DBL *out, int32_t m, DBL *work) {
-        RealData{nullptr, out, 1, 1, work}.twiddle(plan, level, m);
+    static void twiddle(const FFTStage &stage, const DBL *in, ptrdiff_t inLeg, DBL *out,
+                        int32_t m) {
+        stage.kernels->realLanesTwiddle(in, inLeg, out, stage, m);
     }
+    static void primeTwiddle(const PrimeFactor &factor, DBL *out, int32_t m, DBL *work) {
+        PrimeRealTwiddle(factor, out, 1, m, work);
+    }
+};
+
+// What a transform works in besides its results; either may be null.
+struct LanesMemory {
+    DBL *work;   // of the prime stages
+    DBL *buffer; // of the plan's bufferLevel
 };
 
 template <class Path>
 void RecurseLanes(const FFTPlan &plan, int32_t level, int32_t n, const DBL *in, DBL *out,
-                  ptrdiff_t inStride, const Bundle &bundle, DBL *work) {
+                  ptrdiff_t inStride, const Bundle &bundle, const LanesMemory &memory) {
     const int32_t p = plan.factors[level];
     const int32_t m = n / p;
-    const ptrdiff_t block = m * Path::width;
+    const bool buffered = memory.buffer != nullptr && level == plan.bufferLevel;
+    const ptrdiff_t side = m * Path::width;
+    const ptrdiff_t block = buffered ? BlockPitch(side) : side;
+    DBL *const blocks = buffered ? memory.buffer : out;
+    const ptrdiff_t nextBlocks = buffered ? p * block : bundle.outStride;
     if (level == plan.factorCount - 2) {
         const KernelSet &kernels = *plan.stages[level + 1]->kernels;
         if (bundle.count == 1)
-            Path::leaf(kernels, in, out, {{p, 1}, {inStride, 0}, {block, 0}, p * inStride});
+            Path::leaf(kernels, in, blocks, {{p, 1}, {inStride, 0}, {block, 0}, p * inStride});
         else
-            Path::leaf(kernels, in, out,
+            Path::leaf(kernels, in, blocks,
                        {{bundle.count, p},
                         {bundle.inStride, inStride},
-                        {bundle.outStride, block},
+                        {nextBlocks, block},
                         p * inStride});
     } else if (bundle.count > 1) {
         for (ptrdiff_t j = 0; j < p; ++j)
-            RecurseLanes<Path>(plan, level + 1, m, in + j * inStride, out + j * block, p * inStride,
-                               bundle, work);
+            RecurseLanes<Path>(plan, level + 1, m, in + j * inStride, blocks + j * block,
+                               p * inStride, {bundle.count, bundle.inStride, nextBlocks}, memory);
     } else {
         for (ptrdiff_t j = 0; j < p; j += leafBundle)
-            RecurseLanes<Path>(plan, level + 1, m, in + j * inStride, out + j * block, p * inStride,
-                               {std::min<ptrdiff_t>(leafBundle, p - j), inStride, block}, work);
+            RecurseLanes<Path>(plan, level + 1, m, in + j * inStride, blocks + j * block,
+                               p * inStride,
+                               {std::min<ptrdiff_t>(leafBundle, p - j), inStride, block}, memory);
     }
-    for (ptrdiff_t b = 0; b < bundle.count; ++b)
-        Path::twiddle(plan, level, out + b * bundle.outStride, m, work);
+    for (ptrdiff_t b = 0; b < bundle.count; ++b) {
+        DBL *const results = out + b * bundle.outStride;
+        if (plan.kinds[level] == KernelFactor)
+            Path::twiddle(*plan.stages[level], blocks + b * nextBlocks, block, results, m);
+        else
+            Path::primeTwiddle(PrimeAt(plan, level), results, m, memory.work);
+    }
+}
+
+// The buffer of a plan while one transform has it.
+class BufferLoan {
+public:
+    explicit BufferLoan(const FFTPlan &plan)
+        : plan_(plan), memory_(plan.buffer.exchange(nullptr, std::memory_order_acquire)) {}
+    ~BufferLoan() {
+        if (memory_ != nullptr)
+            plan_.buffer.store(memory_, std::memory_order_release);
+    }
+    BufferLoan(const BufferLoan &) = delete;
+    BufferLoan &operator=(const BufferLoan &) = delete;
+
+    // At the next cache line, or null.
+    DBL *data() const {
+        const auto address = reinterpret_cast<std::uintptr_t>(memory_);
+        return reinterpret_cast<DBL *>((address + 63) / 64 * 64);
+    }
+
+private:
+    const FFTPlan &plan_;
+    void *memory_;
+};
+
+template <class Path>
+__attribute__((noinline)) void RunOnStack(const FFTPlan &plan, const DBL *in, DBL *out,
+                                          ptrdiff_t inStride, DBL *work) {
+    alignas(64) double buffer[stackBufferValues];
+    RecurseLanes<Path>(plan, 0, plan.length, in, out, inStride, {1, 0, 0}, {work, buffer});
+}
+
+template <class Path>
+void RunLanes(const FFTPlan &plan, const DBL *in, DBL *out, ptrdiff_t inStride, DBL *work) {
+    const int32_t level = plan.bufferLevel;
+    if (level < 0 || !Path::gainsByBuffer(plan.factors[level], plan.length / plan.bufferBlocks))
+        return RecurseLanes<Path>(plan, 0, plan.length, in, out, inStride, {1, 0, 0},
+                                  {work, nullptr});
+    if (BufferValues(plan, Path::width) <= stackBufferValues)
+        return RunOnStack<Path>(plan, in, out, inStride, work);
+    const BufferLoan loan(plan);
+    RecurseLanes<Path>(plan, 0, plan.length, in, out, inStride, {1, 0, 0}, {work, loan.data()});
 }
 
 bool LeafHasKernels(const FFTPlan &plan) {
@@ -197,9 +269,8 @@ void MirrorSums(DBL *values, ptrdiff_t stride, ptrdiff_t n) {
 
 void ExecuteComplex(const FFTPlan &plan, const DBL *inRe, const DBL *inIm, DBL *outRe, DBL *outIm,
                     ptrdiff_t inStride, ptrdiff_t outStride, DBL *work) {
-    const bool interleaved = inIm == inRe + 1 && outIm == outRe + 1 && outStride == 2;
     if (plan.whole.complex != nullptr) {
-        if (interleaved && inStride == 2)
+        if (IsInterleaved(inRe, inIm, inStride) && IsInterleaved(outRe, outIm, outStride))
             plan.whole.complex(inRe, outRe);
         else
             WholeComplex(plan, inRe, inIm, outRe, outIm, inStride, outStride);
@@ -213,9 +284,8 @@ void ExecuteComplex(const FFTPlan &plan, const DBL *inRe, const DBL *inIm, DBL *
     const ComplexData data{inRe, inIm, outRe, outIm, inStride, outStride, work};
     if (plan.factorCount == 1)
         return data.leaf(plan, 1);
-    if (interleaved && LeafHasKernels(plan))
-        return RecurseLanes<ComplexLanesPath>(plan, 0, plan.length, inRe, outRe, inStride,
-                                              {1, 0, 0}, work);
+    if (inIm == inRe + 1 && IsInterleaved(outRe, outIm, outStride) && LeafHasKernels(plan))
+        return RunLanes<ComplexLanesPath>(plan, inRe, outRe, inStride, work);
     Recurse(plan, 0, plan.length, data);
 }
 
@@ -236,8 +306,7 @@ void ExecuteReal(const FFTPlan &plan, const DBL *in, DBL *out, ptrdiff_t inStrid
     if (plan.factorCount == 1)
         return data.leaf(plan, 1);
     if (outStride == 1 && LeafHasKernels(plan))
-        return RecurseLanes<RealLanesPath>(plan, 0, plan.length, in, out, inStride, {1, 0, 0},
-                                           work);
+        return RunLanes<RealLanesPath>(plan, in, out, inStride, work);
     Recurse(plan, 0, plan.length, data);
 }
 
@@ -299,7 +368,13 @@ ErrorCode FFTRealInverse(const FFTPlan *plan, DBL *in, DBL *out, int32_t inStrid
 
 ErrorCode FFTComplexForward(const FFTPlan *plan, const DBL *inRe, const DBL *inIm, DBL *outRe,
                             DBL *outIm, int32_t inStride, int32_t outStride, int32_t n) {
-    if (plan->complexWork == 0) // without the scope of a block, which short transforms feel
+    // Short transforms feel every call and the scope of a block.
+    if (plan->whole.complex != nullptr && n == plan->length &&
+        IsInterleaved(inRe, inIm, inStride) && IsInterleaved(outRe, outIm, outStride)) {
+        plan->whole.complex(inRe, outRe);
+        return 0;
+    }
+    if (plan->complexWork == 0)
         return FFTComplexForward(plan, inRe, inIm, outRe, outIm, inStride, outStride, n, nullptr);
     TransformWork work;
     if (const ErrorCode failed = work.take(plan->complexWork))
@@ -317,6 +392,10 @@ ErrorCode FFTComplexInverse(const FFTPlan *plan, const DBL *inRe, const DBL *inI
 
 ErrorCode FFTRealForward(const FFTPlan *plan, const DBL *in, DBL *out, int32_t inStride,
                          int32_t outStride, int32_t n) {
+    if (plan->whole.real != nullptr && n == plan->length && inStride == 1 && outStride == 1) {
+        plan->whole.real(in, out);
+        return 0;
+    }
     if (plan->realWork == 0)
         return FFTRealForward(plan, in, out, inStride, outStride, n, nullptr);
     TransformWork work;

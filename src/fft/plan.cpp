@@ -232,6 +232,26 @@ void MeasureWork(FFTPlan *plan) {
     }
 }
 
+// From the second level on only where the first alone would leave the blocks of the second in each
+// other's cache sets.
+bool BuildBuffer(FFTPlan *plan) {
+    constexpr int32_t longestBuffered = 1 << 17; // beyond, the memory costs what the order gains
+    const int32_t level = plan->factorCount > 3 && plan->factors[0] <= 4 ? 1 : 0;
+    plan->bufferLevel = -1;
+    if (plan->factorCount < 2 || plan->length > longestBuffered ||
+        plan->kinds[level] != KernelFactor || plan->kinds[plan->factorCount - 1] != KernelFactor)
+        return true;
+    plan->bufferLevel = level;
+    plan->bufferBlocks = plan->factors[0] * (level == 0 ? 1 : plan->factors[1]);
+    const int64_t values = BufferValues(*plan, 2);
+    if (values <= stackBufferValues)
+        return true;
+    DBL *memory = nullptr;
+    const bool built = Allocate(memory, values + lineValues);
+    plan->buffer.store(memory, std::memory_order_relaxed);
+    return built;
+}
+
 void FillKernels(FFTPlan *plan) {
     for (int32_t s = 0; s < plan->factorCount; ++s) {
         if (plan->kinds[s] != KernelFactor)
@@ -258,6 +278,7 @@ void Dismantle(FFTPlan *plan) {
         qx::destroy_oxfft_table(stage->raderPlan);
         std::free(stage);
     }
+    std::free(plan->buffer.load(std::memory_order_relaxed));
     std::free(const_cast<double *>(plan->quarterWave.load(std::memory_order_relaxed)));
     std::free(plan);
 }
@@ -269,7 +290,7 @@ FFTPlan *Build(int32_t length) {
     plan->length = length;
     Factorise(plan);
     FillKernels(plan);
-    if (!BuildStages(plan)) {
+    if (!BuildStages(plan) || !BuildBuffer(plan)) {
         Dismantle(plan);
         return nullptr;
     }

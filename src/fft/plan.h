@@ -64,7 +64,8 @@ struct FFTStage {
 };
 
 // Everything that a transform of one length needs. Read-only from its creation to its release,
-// apart from the last field, which is set once.
+// apart from the last two fields: a buffer that transforms lend themselves, and a table that is set
+// once.
 struct FFTPlan {
     static constexpr int32_t maxFactors = 20; // no int32 length has more
 
@@ -88,11 +89,32 @@ struct FFTPlan {
     // prime is among the factors.
     int64_t complexWork, realWork;
 
+    // The blocks that the stage of one level combines may stand in a buffer, from which the stage
+    // brings them to the results: on cache lines of their own, where results of the host are not,
+    // and at distances at which a column's values do not fall into one set of the cache. The level,
+    // -1 for none, and the number of blocks.
+    int32_t bufferLevel, bufferBlocks;
+    // The buffer that does not fit the stack, for one transform at a time; null while one has it.
+    // Others do without, with the same results.
+    mutable std::atomic<void *> buffer;
+
     // Twiddles of the cosine transforms, built by QuarterWave at its first call; else null.
     mutable std::atomic<const double *> quarterWave;
 };
 
 namespace qx {
+
+// In a buffer each block begins on a cache line and is followed by a spare one.
+constexpr int32_t lineValues = 64 / sizeof(DBL);
+inline std::ptrdiff_t BlockPitch(std::ptrdiff_t values) {
+    return (values + lineValues - 1) / lineValues * lineValues + lineValues;
+}
+// The values of a plan's buffer, for data of so many DBL units a value.
+inline std::ptrdiff_t BufferValues(const FFTPlan &plan, std::ptrdiff_t width) {
+    return plan.bufferBlocks * BlockPitch(width * (plan.length / plan.bufferBlocks));
+}
+// Buffers up to this size stand on the stack.
+constexpr int32_t stackBufferValues = 2304;
 
 // The inner side of the two exports of the same names: the shared plan of a length, or null, and
 // its return. (Qualified in calls: the exports are visible too.)

@@ -5,7 +5,6 @@
 #include "qx/types.h"
 
 #include <cstddef>
-#include <cstring>
 
 // Operations become part of the loop that uses them, at every level of optimisation.
 #define QX_INLINE __attribute__((always_inline)) inline
@@ -39,11 +38,13 @@ struct LaneVector;
 template <>
 struct LaneVector<2> {
     typedef double type __attribute__((vector_size(16)));
+    typedef double inMemory __attribute__((vector_size(16), aligned(1), may_alias));
     static QX_INLINE type broadcast(double x) { return type{x, x}; }
 };
 template <>
 struct LaneVector<4> {
     typedef double type __attribute__((vector_size(32)));
+    typedef double inMemory __attribute__((vector_size(32), aligned(1), may_alias));
     static QX_INLINE type broadcast(double x) { return type{x, x, x, x}; }
 };
 
@@ -58,12 +59,14 @@ public:
     QX_INLINE explicit Lanes(double value) : v(LaneVector<N>::broadcast(value)) {}
     QX_INLINE explicit Lanes(Vector vector) : v(vector) {}
 
+    // Through a type of the memory and not std::memcpy, which g++ 12 leads through a copy on the
+    // stack.
     static QX_INLINE Lanes load(const DBL *x) {
-        Lanes lanes;
-        std::memcpy(&lanes.v, x, sizeof lanes.v);
-        return lanes;
+        return Lanes(Vector(*reinterpret_cast<const typename LaneVector<N>::inMemory *>(x)));
     }
-    QX_INLINE void store(DBL *x) const { std::memcpy(x, &v, sizeof v); }
+    QX_INLINE void store(DBL *x) const {
+        *reinterpret_cast<typename LaneVector<N>::inMemory *>(x) = v;
+    }
 
     // Elements 0, stride, 2 stride, ...
     static QX_INLINE Lanes gather(const DBL *x, std::ptrdiff_t stride) {

@@ -100,21 +100,23 @@ __attribute__((noinline)) void ComplexLeafRows(const DBL *in, DBL *out,
         const DBL *column = in + b * columns.inStride[1];
         DBL *results = out + b * columns.outStride[1];
         ptrdiff_t left = columns.count[0];
-        for (; left >= packedColumns; left -= packedColumns) {
-            PackedGatherIn x;
-            PackedBlocksOut y;
-            for (int i = 0; i < packedColumns; ++i) {
-                x.x[i] = column;
-                y.y[i] = results;
-                column += columns.inStride[0];
-                results += columns.outStride[0];
+        if (columns.inStride[0] == 2) {
+            for (; left >= packedColumns; left -= packedColumns) {
+                PackedBlocksOut y;
+                for (int i = 0; i < packedColumns; ++i) {
+                    y.y[i] = results;
+                    results += columns.outStride[0];
+                }
+                RunPacked<P, Wide>(PackedIn{column, columns.legStride}, y);
+                column += nativeLanes;
             }
-            x.leg = columns.legStride;
-            RunPacked<P, Wide>(x, y);
         }
-        if (left > 0)
+        for (; left > 0; --left) {
             ComplexLeafColumn<P>({column, column + 1, columns.legStride},
                                  {results, results + 1, 2});
+            column += columns.inStride[0];
+            results += columns.outStride[0];
+        }
     }
 }
 
@@ -273,53 +275,71 @@ void ComplexTwiddleKernel(DBL *re, DBL *im, const DBL *twiddleCos, const DBL *tw
 
 // `count` neighbouring columns, as many as fill the lanes.
 template <int P>
-__attribute__((noinline)) void ComplexTwiddleColumns(DBL *columns, ptrdiff_t leg, ptrdiff_t count,
+__attribute__((noinline)) void ComplexTwiddleColumns(const DBL *in, ptrdiff_t inLeg, DBL *out,
+                                                     ptrdiff_t outLeg, ptrdiff_t count,
                                                      const DBL *lanes) {
     for (ptrdiff_t k = 0; k < count; k += packedColumns) {
-        DBL *const at = columns + 2 * k;
-        RunPacked<P, Wide>(PackedTwiddledIn{{at, leg}, lanes}, PackedOut{at, leg});
+        RunPacked<P, Wide>(PackedTwiddledIn{{in + 2 * k, inLeg}, lanes},
+                           PackedOut{out + 2 * k, outLeg});
         lanes += nativeLanes * (P - 1);
     }
 }
 
 template <int P>
-void ComplexLanesTwiddle(DBL *data, const FFTStage &stage, ptrdiff_t m) {
+void ComplexLanesTwiddle(const DBL *in, ptrdiff_t inLeg, DBL *out, const FFTStage &stage,
+                         ptrdiff_t m) {
     const ptrdiff_t leg = 2 * m;
     if (legsCollide(leg, P)) { // m is a multiple of the columns that are copied
         constexpr ptrdiff_t copied = 8;
         constexpr int width = 2 * copied;
         double rows[P * width];
         for (ptrdiff_t k = 0; k < m; k += copied) {
-            CopyRows<width>(data + 2 * k, leg, rows, width, P);
-            ComplexTwiddleColumns<P>(rows, width, copied, stage.complexLanes + 2 * k * (P - 1));
-            CopyRows<width>(rows, width, data + 2 * k, leg, P);
+            const DBL *const lanes = stage.complexLanes + 2 * k * (P - 1);
+            if (legsCollide(inLeg, P)) {
+                CopyRows<width>(in + 2 * k, inLeg, rows, width, P);
+                ComplexTwiddleColumns<P>(rows, width, rows, width, copied, lanes);
+            } else {
+                ComplexTwiddleColumns<P>(in + 2 * k, inLeg, rows, width, copied, lanes);
+            }
+            CopyRows<width>(rows, width, out + 2 * k, leg, P);
         }
         return;
     }
     const ptrdiff_t whole = m - m % packedColumns;
-    ComplexTwiddleColumns<P>(data, leg, whole, stage.complexLanes);
+    ComplexTwiddleColumns<P>(in, inLeg, out, leg, whole, stage.complexLanes);
     if (whole < m) {
         const ptrdiff_t entry = (whole - 1) * (P - 1);
-        DBL *const column = data + 2 * whole;
+        const DBL *const from = in + 2 * whole;
+        DBL *const to = out + 2 * whole;
         ComplexTwiddleColumn<P>(
-            {{column, column + 1, leg}, stage.twiddleCos + entry, stage.twiddleSin + entry},
-            {column, column + 1, leg});
+            {{from, from + 1, inLeg}, stage.twiddleCos + entry, stage.twiddleSin + entry},
+            {to, to + 1, leg});
     }
 }
 
+// Where a stage of the real path finds its blocks and where its results go, each at a leg of its
+// own.
+struct RealBlocks {
+    const DBL *in;
+    ptrdiff_t inLeg;
+    DBL *out;
+    ptrdiff_t outLeg;
+};
+
 // Columns 0 and, for even m, m / 2: real values in every block.
 template <int P>
-void RealEdgeColumns(DBL *data, ptrdiff_t stride, ptrdiff_t m) {
-    const ptrdiff_t leg = m * stride;
-    RealLeafColumn<P>({data, leg}, {data, leg});
+void RealEdgeColumns(const RealBlocks &blocks, ptrdiff_t stride, ptrdiff_t m) {
+    RealLeafColumn<P>({blocks.in, blocks.inLeg}, {blocks.out, blocks.outLeg});
     if (m % 2 != 0)
         return;
-    DBL *const middle = data + m / 2 * stride;
+    const RealColumnIn in{blocks.in + m / 2 * stride, blocks.inLeg};
+    DBL *const middle = blocks.out + m / 2 * stride;
     if constexpr (P % 2 == 0)
-        OddTransform<P>::template run<Narrow>(RealColumnIn{middle, leg},
-                                              HalfComplexColumnOut<P>{middle, middle, leg});
+        OddTransform<P>::template run<Narrow>(
+            in, HalfComplexColumnOut<P>{middle, middle, blocks.outLeg});
     else
-        RunReal<P, Narrow>(AlternatingColumnIn{middle, leg}, MiddleColumnOut<P>{middle, leg});
+        RunReal<P, Narrow>(AlternatingColumnIn{in.x, in.leg},
+                           MiddleColumnOut<P>{middle, blocks.outLeg});
 }
 
 template <int P>
@@ -330,27 +350,29 @@ __attribute__((noinline)) void RealPairColumns(const TwiddledColumnIn &in,
 
 // The pairs of columns from k to the last.
 template <int P>
-void RealPairs(DBL *data, const DBL *twiddleCos, const DBL *twiddleSin, ptrdiff_t stride,
-               ptrdiff_t m, ptrdiff_t k) {
-    const ptrdiff_t leg = m * stride;
+void RealPairs(const RealBlocks &blocks, const DBL *twiddleCos, const DBL *twiddleSin,
+               ptrdiff_t stride, ptrdiff_t m, ptrdiff_t k) {
     for (; k <= (m - 1) / 2; ++k) {
         const ptrdiff_t entry = (k - 1) * (P - 1);
-        DBL *const up = data + k * stride;
-        DBL *const down = data + (m - k) * stride;
-        RealPairColumns<P>({{up, down, leg}, twiddleCos + entry, twiddleSin + entry},
-                           {up, down, leg});
+        const ptrdiff_t up = k * stride;
+        const ptrdiff_t down = (m - k) * stride;
+        RealPairColumns<P>({{blocks.in + up, blocks.in + down, blocks.inLeg},
+                            twiddleCos + entry,
+                            twiddleSin + entry},
+                           {blocks.out + up, blocks.out + down, blocks.outLeg});
     }
 }
 
 template <int P>
 void RealTwiddleKernel(DBL *data, const DBL *twiddleCos, const DBL *twiddleSin, ptrdiff_t stride,
                        int32_t m) {
-    RealEdgeColumns<P>(data, stride, m);
-    RealPairs<P>(data, twiddleCos, twiddleSin, stride, m, 1);
+    const RealBlocks inPlace{data, m * stride, data, m * stride};
+    RealEdgeColumns<P>(inPlace, stride, m);
+    RealPairs<P>(inPlace, twiddleCos, twiddleSin, stride, m, 1);
 }
 
-// `count` neighbouring pairs of columns, as many as fill the lanes; `down` is behind the highest of
-// the mirrored columns.
+// `count` neighbouring pairs of columns, as many as fill the lanes, in place; `down` is behind the
+// highest of the mirrored columns.
 template <int P>
 __attribute__((noinline)) void RealPairLanes(DBL *up, DBL *down, ptrdiff_t leg, ptrdiff_t count,
                                              const DBL *lanes) {
@@ -363,32 +385,45 @@ __attribute__((noinline)) void RealPairLanes(DBL *up, DBL *down, ptrdiff_t leg, 
     }
 }
 
+// The pairs from k on, as many as make up blocks of `Copied`, by way of the stack. Returns the
+// next.
+template <int P, int Copied>
+ptrdiff_t RealPairsOnStack(const RealBlocks &blocks, const FFTStage &stage, ptrdiff_t m,
+                           ptrdiff_t k) {
+    constexpr int width = 2 * Copied;
+    double rows[P * width];
+    for (; k + Copied - 1 <= (m - 1) / 2; k += Copied) {
+        const ptrdiff_t down = m - k - (Copied - 1);
+        CopyRows<Copied>(blocks.in + k, blocks.inLeg, rows, width, P);
+        CopyRows<Copied>(blocks.in + down, blocks.inLeg, rows + Copied, width, P);
+        RealPairLanes<P>(rows, rows + width, width, Copied,
+                         stage.realLanes + 2 * (k - 1) * (P - 1));
+        CopyRows<Copied>(rows, width, blocks.out + k, blocks.outLeg, P);
+        CopyRows<Copied>(rows + Copied, width, blocks.out + down, blocks.outLeg, P);
+    }
+    return k;
+}
+
 template <int P>
-void RealLanesTwiddle(DBL *data, const FFTStage &stage, ptrdiff_t m) {
-    RealEdgeColumns<P>(data, 1, m);
+void RealLanesTwiddle(const DBL *in, ptrdiff_t inLeg, DBL *out, const FFTStage &stage,
+                      ptrdiff_t m) {
+    const RealBlocks blocks{in, inLeg, out, m};
+    RealEdgeColumns<P>(blocks, 1, m);
     ptrdiff_t k = 1;
     if constexpr (!standsAlone(P)) {
-        constexpr int copied = 8;
-        if (legsCollide(m, P)) {
-            double rows[2 * P * copied];
-            for (; k + copied - 1 <= (m - 1) / 2; k += copied) {
-                DBL *const up = data + k;
-                DBL *const down = data + m - k - (copied - 1);
-                CopyRows<copied>(up, m, rows, 2 * copied, P);
-                CopyRows<copied>(down, m, rows + copied, 2 * copied, P);
-                RealPairLanes<P>(rows, rows + 2 * copied, 2 * copied, copied,
-                                 stage.realLanes + 2 * (k - 1) * (P - 1));
-                CopyRows<copied>(rows, 2 * copied, up, m, P);
-                CopyRows<copied>(rows + copied, 2 * copied, down, m, P);
-            }
+        if (legsCollide(m, P))
+            k = RealPairsOnStack<P, 8>(blocks, stage, m, k);
+        if (in != out) {
+            k = RealPairsOnStack<P, nativeLanes>(blocks, stage, m, k);
+        } else {
+            const ptrdiff_t left = (m - 1) / 2 - (k - 1);
+            const ptrdiff_t whole = left - left % nativeLanes;
+            RealPairLanes<P>(out + k, out + m - k + 1, m, whole,
+                             stage.realLanes + 2 * (k - 1) * (P - 1));
+            k += whole;
         }
-        const ptrdiff_t left = (m - 1) / 2 - (k - 1);
-        const ptrdiff_t whole = left - left % nativeLanes;
-        RealPairLanes<P>(data + k, data + m - k + 1, m, whole,
-                         stage.realLanes + 2 * (k - 1) * (P - 1));
-        k += whole;
     }
-    RealPairs<P>(data, stage.twiddleCos, stage.twiddleSin, 1, m, k);
+    RealPairs<P>(blocks, stage.twiddleCos, stage.twiddleSin, 1, m, k);
 }
 
 template <int P>

@@ -35,9 +35,11 @@ struct KernelSet {
     ComplexTwiddle complexTwiddle;
 
     void (*realLanesLeaf)(const DBL *in, DBL *out, const LeafColumns &columns);
-    void (*realLanesTwiddle)(DBL *data, const FFTStage &stage, std::ptrdiff_t m);
+    void (*realLanesTwiddle)(const DBL *in, std::ptrdiff_t inLeg, DBL *out, const FFTStage &stage,
+                             std::ptrdiff_t m);
     void (*complexLanesLeaf)(const DBL *in, DBL *out, const LeafColumns &columns);
-    void (*complexLanesTwiddle)(DBL *data, const FFTStage &stage, std::ptrdiff_t m);
+    void (*complexLanesTwiddle)(const DBL *in, std::ptrdiff_t inLeg, DBL *out,
+                                const FFTStage &stage, std::ptrdiff_t m);
 };
 
 // The kernels of one of kernelRadices.

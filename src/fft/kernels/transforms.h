@@ -125,7 +125,8 @@ QX_INLINE Wide LoadPairs(const DBL *const *from, std::ptrdiff_t at) {
 QX_INLINE void StorePairs(Wide pairs, DBL *const *to, std::ptrdiff_t at) {
 #ifdef __AVX2__
     Lanes<2>(__builtin_shufflevector(pairs.v, pairs.v, 0, 1)).store(to[0] + at);
-    Lanes<2>(__builtin_shufflevector(pairs.v, pairs.v, 2, 3)).store(to[1] + at);
+    // As a shuffle g++ makes it one across lanes and a store.
+    Lanes<2>(__builtin_ia32_vextractf128_pd256(pairs.v, 1)).store(to[1] + at);
 #else
     pairs.store(to[0] + at);
 #endif

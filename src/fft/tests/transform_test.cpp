@@ -142,14 +142,22 @@ private:
     std::vector<unsigned char> bytes_;
 };
 
-// One length at other strides and alignments, in parts of their own: the same bits.
+// One length at other strides and alignments, in parts of their own, and beside a transform that
+// has the plan's buffer: the same bits.
 void CheckStrides(int32_t n) {
     SCOPED_TRACE(n);
     const PlanReference plan(n);
     const std::vector<double> x = Noise(2 * n, n);
-    std::vector<double> y(2 * n), h(n);
+    std::vector<double> y(2 * n), h(n), unbufferedY(2 * n), unbufferedH(n);
     ASSERT_EQ(0, qx::FFTComplexForward(plan.get(), &x[0], &x[1], &y[0], &y[1], 2, 2, n));
     ASSERT_EQ(0, qx::FFTRealForward(plan.get(), x.data(), h.data(), 2, 1, n));
+    void *const buffer = plan.get()->buffer.exchange(nullptr);
+    EXPECT_EQ(buffer != nullptr, n > 1200 && n != 53 * 53) << "kernels, and too long for the stack";
+    qx::FFTComplexForward(plan.get(), &x[0], &x[1], &unbufferedY[0], &unbufferedY[1], 2, 2, n);
+    qx::FFTRealForward(plan.get(), x.data(), unbufferedH.data(), 2, 1, n);
+    EXPECT_EQ(plan.get()->buffer.exchange(buffer), nullptr);
+    EXPECT_EQ(y, unbufferedY);
+    EXPECT_EQ(h, unbufferedH);
     for (const int32_t stride : {1, 2, 3}) {
         Strided inRe(n, stride), inIm(n, stride), re(n, 4 - stride), im(n, 4 - stride);
         Strided interleaved(2 * n, 1);
@@ -178,8 +186,8 @@ void CheckStrides(int32_t n) {
 TEST(Transform, GivesTheSameBitsAtEveryStrideAndAlignment) {
     for (int32_t n = 1; n <= 70; ++n)
         CheckStrides(n);
-    for (const int32_t n :
-         {100, 107, 167, 210, 2 * 167, 529, 720, 1000, 1024, 2048, 2809, 8192, 17 * 1024, 24010})
+    for (const int32_t n : {100, 107, 167, 210, 2 * 167, 529, 720, 1000, 1024, 2048, 2809, 8192,
+                            17 * 1024, 24010, 65536})
         CheckStrides(n);
 }
 
@@ -273,7 +281,7 @@ TEST(Transform, RealInverseLeavesTheHartleyForm) {
 }
 
 TEST(Transform, ThreadsShareAPlan) {
-    for (const int32_t n : {1000, 107, 46}) {
+    for (const int32_t n : {1000, 107, 46, 8192}) {
         const PlanReference plan(n);
         const std::vector<double> x = Noise(2 * n);
         std::vector<double> expected(2 * n);
