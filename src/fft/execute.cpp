@@ -1,6 +1,7 @@
 #include "fft/execute.h"
 
 #include "fft/kernels/kernels.h"
+#include "fft/passes.h"
 #include "fft/prime_stages.h"
 
 #include <algorithm>
@@ -255,13 +256,27 @@ void WholeReal(const FFTPlan &plan, const DBL *in, DBL *out, ptrdiff_t inStride,
         out[k * outStride] = h[k];
 }
 
-// Sums and differences of mirrored elements: half-complex form to Hartley form and back.
-void MirrorSums(DBL *values, ptrdiff_t stride, ptrdiff_t n) {
-    for (ptrdiff_t k = 1; k <= (n + 1) / 2 - 1; ++k) {
+// MirrorSums at any stride.
+void MirrorSumsAt(DBL *values, ptrdiff_t stride, ptrdiff_t n) {
+    for (ptrdiff_t k = 1; k <= (n - 1) / 2; ++k) {
         const double a = values[k * stride];
         const double b = values[(n - k) * stride];
         values[k * stride] = a - b;
         values[(n - k) * stride] = a + b;
+    }
+}
+
+// ScaleReversed at any strides.
+void ScaleReversedAt(DBL *re, DBL *im, ptrdiff_t stride, double scale, ptrdiff_t n) {
+    re[0] *= scale;
+    im[0] *= scale;
+    for (ptrdiff_t k = 1; 2 * k <= n; ++k) {
+        for (DBL *const part : {re, im}) {
+            const double a = part[k * stride] * scale;
+            const double b = part[(n - k) * stride] * scale;
+            part[k * stride] = b;
+            part[(n - k) * stride] = a;
+        }
     }
 }
 
@@ -324,21 +339,10 @@ ErrorCode FFTComplexInverse(const FFTPlan *plan, const DBL *inRe, const DBL *inI
         FFTComplexForward(plan, inRe, inIm, outRe, outIm, inStride, outStride, n, work);
     if (status < 0)
         return status;
-    const double scale = 1.0 / n;
-    const ptrdiff_t stride = outStride;
-    outRe[0] *= scale;
-    outIm[0] *= scale;
-    // Reversal of the indices turns a forward transform into an inverse one.
-    for (ptrdiff_t k = 1; 2 * k <= n; ++k) {
-        DBL *const left[2] = {outRe + k * stride, outIm + k * stride};
-        DBL *const right[2] = {outRe + (n - k) * stride, outIm + (n - k) * stride};
-        for (int32_t part = 0; part < 2; ++part) {
-            const double a = *left[part] * scale;
-            const double b = *right[part] * scale;
-            *left[part] = b;
-            *right[part] = a;
-        }
-    }
+    if (IsInterleaved(outRe, outIm, outStride))
+        ScaleReversed(outRe, 1.0 / n, n);
+    else
+        ScaleReversedAt(outRe, outIm, outStride, 1.0 / n, n);
     return status;
 }
 
@@ -355,12 +359,18 @@ ErrorCode FFTRealInverse(const FFTPlan *plan, DBL *in, DBL *out, int32_t inStrid
     if (n != plan->length)
         return ErrInternal;
     const double scale = 1.0 / n;
-    for (ptrdiff_t k = 0; k < n; ++k)
-        in[k * inStride] *= scale;
-    MirrorSums(in, inStride, n);
+    if (inStride == 1) {
+        ScaledMirrorSums(in, scale, n);
+    } else {
+        for (ptrdiff_t k = 0; k < n; ++k)
+            in[k * inStride] *= scale;
+        MirrorSumsAt(in, inStride, n);
+    }
     ExecuteReal(*plan, in, out, inStride, outStride, work);
-    if (n > 2)
-        MirrorSums(out, outStride, n);
+    if (outStride == 1)
+        MirrorSums(out, n);
+    else
+        MirrorSumsAt(out, outStride, n);
     return 0;
 }
 

@@ -1,5 +1,7 @@
 #include "fft/half_complex.h"
 
+#include "fft/passes.h"
+
 #include <cstddef>
 
 namespace qx {
@@ -15,10 +17,9 @@ void ExpandPlain(DBL *buffer, std::ptrdiff_t n) {
     const double nyquist = h[n / 2];
     // Element k ends at 2k + 1, which reaches into h only where h[0] stood.
     SetElement(buffer, 0, h[0], 0);
-    for (std::ptrdiff_t k = 1; k <= (n - 1) / 2; ++k)
-        SetElement(buffer, k, h[k], h[n - k]);
-    for (std::ptrdiff_t k = 1; k <= (n - 1) / 2; ++k)
-        SetElement(buffer, n - k, buffer[2 * k], -buffer[2 * k + 1]);
+    const auto pairs = static_cast<int32_t>((n - 1) / 2);
+    JoinMirrored(h + 1, h + n - 1, buffer + 2, pairs);
+    ConjugateBackward(buffer + 2, buffer + 2 * (n - 1), pairs);
     if (n % 2 == 0)
         SetElement(buffer, n / 2, nyquist, 0);
 }
@@ -29,10 +30,10 @@ void ExpandShifted(DBL *buffer, std::ptrdiff_t n) {
     const double zeroFrequency = h[0];
     const double nyquist = h[middle];
     // The elements above the middle one stand behind h, which is overwritten after them.
-    for (std::ptrdiff_t k = 1; k <= (n - 1) / 2; ++k)
-        SetElement(buffer, middle + k, h[k], h[n - k]);
-    for (std::ptrdiff_t k = 1; k <= (n - 1) / 2; ++k)
-        SetElement(buffer, middle - k, buffer[2 * (middle + k)], -buffer[2 * (middle + k) + 1]);
+    const auto pairs = static_cast<int32_t>((n - 1) / 2);
+    DBL *const zero = buffer + 2 * middle;
+    JoinMirrored(h + 1, h + n - 1, zero + 2, pairs);
+    ConjugateBackward(zero + 2, zero - 2, pairs);
     if (n % 2 == 0)
         SetElement(buffer, 0, nyquist, 0);
     SetElement(buffer, middle, zeroFrequency, 0);

@@ -1,6 +1,7 @@
 #include "fft/two_dimensional.h"
 
 #include "fft/column_block.h"
+#include "fft/passes.h"
 #include "fft/shifted_order.h"
 #include "frame/heap_block.h"
 
@@ -136,8 +137,11 @@ ErrorCode ForwardColumns(const FFTPlan *plan, const ComplexBlock &matrix, int32_
 // form is h.
 void KeepHalf(const DBL *h, int32_t n, int32_t shift, CDB *kept) {
     const std::ptrdiff_t half = n / 2;
-    for (std::ptrdiff_t k = 1; k <= (n - 1) / 2; ++k)
-        kept[shift == 0 ? k : half - k] = CDB{h[k], shift == 0 ? h[n - k] : -h[n - k]};
+    if (shift == 0)
+        JoinMirrored(h + 1, h + n - 1, &kept[1].re, (n - 1) / 2);
+    else
+        for (std::ptrdiff_t k = 1; k <= (n - 1) / 2; ++k)
+            kept[half - k] = CDB{h[k], -h[n - k]};
     kept[shift == 0 ? 0 : half] = CDB{h[0], 0};
     if (n % 2 == 0)
         kept[shift == 0 ? half : 0] = CDB{h[half], 0};

@@ -88,6 +88,34 @@ public:
             return Lanes(__builtin_shufflevector(v, v, 3, 2, 1, 0));
     }
 
+    // Of the values of a, followed by those of b, every second one from the first or from the
+    // second on; and the first or the second half of the values of a and b by turns. (Not for N
+    // = 1.)
+    friend QX_INLINE Lanes Evens(Lanes a, Lanes b) {
+        if constexpr (N == 2)
+            return Lanes(__builtin_shufflevector(a.v, b.v, 0, 2));
+        else
+            return Lanes(__builtin_shufflevector(a.v, b.v, 0, 2, 4, 6));
+    }
+    friend QX_INLINE Lanes Odds(Lanes a, Lanes b) {
+        if constexpr (N == 2)
+            return Lanes(__builtin_shufflevector(a.v, b.v, 1, 3));
+        else
+            return Lanes(__builtin_shufflevector(a.v, b.v, 1, 3, 5, 7));
+    }
+    friend QX_INLINE Lanes TurnsLow(Lanes a, Lanes b) {
+        if constexpr (N == 2)
+            return Lanes(__builtin_shufflevector(a.v, b.v, 0, 2));
+        else
+            return Lanes(__builtin_shufflevector(a.v, b.v, 0, 4, 1, 5));
+    }
+    friend QX_INLINE Lanes TurnsHigh(Lanes a, Lanes b) {
+        if constexpr (N == 2)
+            return Lanes(__builtin_shufflevector(a.v, b.v, 1, 3));
+        else
+            return Lanes(__builtin_shufflevector(a.v, b.v, 2, 6, 3, 7));
+    }
+
     QX_INLINE double operator[](int lane) const { return v[lane]; }
 
     friend QX_INLINE Lanes operator+(Lanes a, Lanes b) { return Lanes(a.v + b.v); }

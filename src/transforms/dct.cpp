@@ -2,6 +2,7 @@
 
 #include "fft/quarter_wave.h"
 #include "frame/lanes.h"
+#include "transforms/dct_passes.h"
 #include "transforms/strided_window.h"
 
 #include <cmath>
@@ -21,15 +22,19 @@ typedef Lanes<2> Pair;
 template <class Length>
 ErrorCode ForwardEven(const FFTPlan *plan, const DBL *x, std::ptrdiff_t inStride, DBL *out,
                       std::ptrdiff_t outStride, Length n, DBL *work) {
+    constexpr bool isLong = std::is_same_v<Length, int32_t>;
     const double scale = 2.0 / std::sqrt(2.0 * n);
     const double root = std::sqrt(static_cast<double>(n));
     DBL *const reordered = work;
     DBL *const h = work + n;
-    for (std::ptrdiff_t j = 0; j < n / 2; ++j) {
-        reordered[j] = x[2 * j * inStride];
-        reordered[n - 1 - j] = x[(2 * j + 1) * inStride];
-    }
-    if constexpr (!std::is_same_v<Length, int32_t>)
+    if (isLong && inStride == 1)
+        GatherEvenOdd(x, n, reordered);
+    else
+        for (std::ptrdiff_t j = 0; j < n / 2; ++j) {
+            reordered[j] = x[2 * j * inStride];
+            reordered[n - 1 - j] = x[(2 * j + 1) * inStride];
+        }
+    if constexpr (!isLong)
         plan->whole.real(reordered, h);
     else if (const ErrorCode failed = FFTRealForward(plan, reordered, h, 1, 1, n))
         return failed;
@@ -38,17 +43,12 @@ ErrorCode ForwardEven(const FFTPlan *plan, const DBL *x, std::ptrdiff_t inStride
         return ErrOutOfMemory;
 
     out[0] = h[0] / root;
-    for (std::ptrdiff_t k = 1; k < n / 2; ++k) {
-        if constexpr (std::is_same_v<Length, int32_t>) {
-            const double c = wave[2 * k];
-            const double s = wave[2 * k + 1];
-            const double re = h[k];
-            const double im = h[n - k];
-            out[k * outStride] = (re * c + im * s) * scale;
-            out[(n - k) * outStride] = (re * s - im * c) * scale;
-        } else {
-            // The same with each value of h read by itself: one load of two values that the
-            // transform has stored apart would wait for both stores.
+    if (isLong && outStride == 1)
+        TurnHalfComplex(h, wave, scale, n, out);
+    else
+        for (std::ptrdiff_t k = 1; k < n / 2; ++k) {
+            // Each value of h is read by itself: one load of two values that a short transform has
+            // stored apart would wait for both stores.
             const Pair w = Pair::load(wave + 2 * k);
             const double im = h[n - k];
             const Pair turned = Pair(h[k]) * w + Pair(Pair::Vector{im, -im}) * w.reversed();
@@ -56,7 +56,6 @@ ErrorCode ForwardEven(const FFTPlan *plan, const DBL *x, std::ptrdiff_t inStride
             out[k * outStride] = result[0];
             out[(n - k) * outStride] = result[1];
         }
-    }
     out[n / 2 * outStride] = h[n / 2] * wave[n] * scale;
     return 0;
 }
@@ -96,20 +95,26 @@ ErrorCode InverseEven(const DBL *spectrum, std::ptrdiff_t inStride, DBL *out,
     CDB *const u = z + n;
     const double scale = std::sqrt(2.0 * n);
     z[0] = CDB{spectrum[0] * std::sqrt(static_cast<double>(n)), 0};
-    for (std::ptrdiff_t k = 1; k <= n / 2; ++k) {
-        const double c = wave[2 * k] * scale;
-        const double s = wave[2 * k + 1] * scale;
-        const double low = spectrum[k * inStride];
-        const double high = spectrum[(n - k) * inStride];
-        z[k] = CDB{low * c, low * s};
-        z[n - k] = CDB{high * s, high * c};
-    }
+    if (inStride == 1)
+        TurnReal(spectrum, wave, scale, n, work);
+    else
+        for (std::ptrdiff_t k = 1; k <= n / 2; ++k) {
+            const double c = wave[2 * k] * scale;
+            const double s = wave[2 * k + 1] * scale;
+            const double low = spectrum[k * inStride];
+            const double high = spectrum[(n - k) * inStride];
+            z[k] = CDB{low * c, low * s};
+            z[n - k] = CDB{high * s, high * c};
+        }
     if (const ErrorCode failed = FFTComplexInverse(plan, &z->re, &z->im, &u->re, &u->im, 2, 2, n))
         return failed;
-    for (std::ptrdiff_t j = 0; j < n / 2; ++j) {
-        out[2 * j * outStride] = u[j].re;
-        out[(2 * j + 1) * outStride] = u[n - 1 - j].re;
-    }
+    if (outStride == 1)
+        SpreadEvenOdd(&u->re, n, out);
+    else
+        for (std::ptrdiff_t j = 0; j < n / 2; ++j) {
+            out[2 * j * outStride] = u[j].re;
+            out[(2 * j + 1) * outStride] = u[n - 1 - j].re;
+        }
     return 0;
 }
 

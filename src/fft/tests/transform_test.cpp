@@ -183,9 +183,31 @@ void CheckStrides(int32_t n) {
     }
 }
 
+// Inverses, whose passes over the whole array have a form of their own for values side by side.
+void CheckStridesOfInverses(int32_t n) {
+    SCOPED_TRACE(n);
+    const PlanReference plan(n);
+    const std::vector<double> x = Noise(2 * n, n);
+    std::vector<double> y(2 * n), h(x), back(n), re(3 * n), im(3 * n), wideH(3 * n),
+        wideBack(3 * n);
+    for (int32_t i = 0; i < n; ++i)
+        wideH[3 * i] = x[i];
+    qx::FFTComplexInverse(plan.get(), &x[0], &x[1], &y[0], &y[1], 2, 2, n);
+    qx::FFTComplexInverse(plan.get(), &x[0], &x[1], &re[0], &im[0], 2, 3, n);
+    qx::FFTRealInverse(plan.get(), h.data(), back.data(), 1, 1, n);
+    qx::FFTRealInverse(plan.get(), wideH.data(), wideBack.data(), 3, 3, n);
+    bool same = true;
+    for (int32_t i = 0; i < n; ++i)
+        same = same && re[3 * i] == y[2 * i] && im[3 * i] == y[2 * i + 1] &&
+               wideBack[3 * i] == back[i] && wideH[3 * i] == h[i];
+    EXPECT_TRUE(same);
+}
+
 TEST(Transform, GivesTheSameBitsAtEveryStrideAndAlignment) {
-    for (int32_t n = 1; n <= 70; ++n)
+    for (int32_t n = 1; n <= 70; ++n) {
         CheckStrides(n);
+        CheckStridesOfInverses(n);
+    }
     for (const int32_t n : {100, 107, 167, 210, 2 * 167, 529, 720, 1000, 1024, 2048, 2809, 8192,
                             17 * 1024, 24010, 65536})
         CheckStrides(n);

@@ -1,0 +1,30 @@
+#ifndef QX_FFT_PASSES_H
+#define QX_FFT_PASSES_H
+
+#include "frame/widths.h"
+#include "qx/types.h"
+
+#include <cstdint>
+
+namespace qx {
+
+// The passes over whole arrays before and behind the transforms, for values side by side.
+
+// Sums and differences of mirrored values: half-complex form to Hartley form and back. For k from 1
+// to (n - 1) / 2, value k becomes itself less value n - k, and value n - k their sum.
+QX_BY_WIDTH(void, MirrorSums, (DBL * values, int32_t n))
+// The same of all values times `scale`.
+QX_BY_WIDTH(void, ScaledMirrorSums, (DBL * values, double scale, int32_t n))
+
+// n interleaved complex values times `scale`, k and n - k exchanged: a forward transform becomes an
+// inverse one.
+QX_BY_WIDTH(void, ScaleReversed, (DBL * values, double scale, int32_t n))
+
+// Complex value k becomes (up[k], down[-k]), for k from 0 to count - 1.
+QX_BY_WIDTH(void, JoinMirrored, (const DBL *up, const DBL *down, DBL *complex, int32_t count))
+// The conjugate of complex value k of `from` becomes value -k of `to`, for k from 0 to count - 1.
+QX_BY_WIDTH(void, ConjugateBackward, (const DBL *from, DBL *to, int32_t count))
+
+} // namespace qx
+
+#endif

@@ -1,0 +1,122 @@
+#include "fft/passes.h"
+
+#include "frame/lanes.h"
+
+#include <cstddef>
+
+namespace qx::QX_WIDTH {
+namespace {
+
+using std::ptrdiff_t;
+
+typedef Lanes<nativeLanes> Wide;
+constexpr int complexes = nativeLanes / 2; // values in one Wide
+
+// Complex values in the opposite order.
+QX_INLINE Wide ReversedComplex(Wide x) {
+#ifdef __AVX2__
+    return Wide(__builtin_shufflevector(x.v, x.v, 2, 3, 0, 1));
+#else
+    return x;
+#endif
+}
+
+QX_INLINE Wide Conjugate(Wide x) {
+    typedef int64_t Bits __attribute__((vector_size(sizeof(Wide))));
+#ifdef __AVX2__
+    const Bits sign = {0, INT64_MIN, 0, INT64_MIN};
+#else
+    const Bits sign = {0, INT64_MIN};
+#endif
+    return Wide((Wide::Vector)((Bits)x.v ^ sign));
+}
+
+struct AsItIs {
+    template <class L>
+    QX_INLINE L operator()(L x) const {
+        return x;
+    }
+};
+struct Times {
+    double scale;
+    template <class L>
+    QX_INLINE L operator()(L x) const {
+        return x * L(scale);
+    }
+};
+
+// For k onward, one pair in each lane; scaled(x) is what a value counts for.
+template <class L, class Scaled>
+QX_INLINE void MirrorSome(DBL *values, ptrdiff_t k, ptrdiff_t n, const Scaled &scaled) {
+    const ptrdiff_t opposite = n - k - (L::count - 1);
+    const L a = scaled(L::load(values + k));
+    const L b = scaled(L::load(values + opposite).reversed());
+    (a - b).store(values + k);
+    (a + b).reversed().store(values + opposite);
+}
+
+template <class Scaled>
+QX_INLINE void MirrorAll(DBL *values, ptrdiff_t n, const Scaled &scaled) {
+    const ptrdiff_t last = (n - 1) / 2;
+    ptrdiff_t k = 1;
+    for (; k + nativeLanes - 1 <= last; k += nativeLanes)
+        MirrorSome<Wide>(values, k, n, scaled);
+    for (; k <= last; ++k)
+        MirrorSome<Lanes<1>>(values, k, n, scaled);
+}
+
+} // namespace
+
+void MirrorSums(DBL *values, int32_t n) { MirrorAll(values, n, AsItIs{}); }
+
+void ScaledMirrorSums(DBL *values, double scale, int32_t n) {
+    values[0] *= scale;
+    if (n % 2 == 0)
+        values[n / 2] *= scale;
+    MirrorAll(values, n, Times{scale});
+}
+
+void ScaleReversed(DBL *values, double scale, int32_t n) {
+    values[0] *= scale;
+    values[1] *= scale;
+    DBL *low = values + 2;
+    DBL *high = values + 2 * ptrdiff_t{n};
+    for (; high - low >= 2 * nativeLanes; low += nativeLanes, high -= nativeLanes) {
+        const Wide a = Wide::load(low) * Wide(scale);
+        const Wide b = Wide::load(high - nativeLanes) * Wide(scale);
+        ReversedComplex(b).store(low);
+        ReversedComplex(a).store(high - nativeLanes);
+    }
+    for (; high - low >= 2; low += 2, high -= 2) { // they may be the same value at last
+        const Lanes<2> a = Lanes<2>::load(low) * Lanes<2>(scale);
+        const Lanes<2> b = Lanes<2>::load(high - 2) * Lanes<2>(scale);
+        b.store(low);
+        a.store(high - 2);
+    }
+}
+
+void JoinMirrored(const DBL *up, const DBL *down, DBL *complex, int32_t count) {
+    ptrdiff_t k = 0;
+    for (; k + nativeLanes <= count; k += nativeLanes) {
+        const Wide re = Wide::load(up + k);
+        const Wide im = Wide::load(down - k - (nativeLanes - 1)).reversed();
+        TurnsLow(re, im).store(complex + 2 * k);
+        TurnsHigh(re, im).store(complex + 2 * k + nativeLanes);
+    }
+    for (; k < count; ++k) {
+        complex[2 * k] = up[k];
+        complex[2 * k + 1] = down[-k];
+    }
+}
+
+void ConjugateBackward(const DBL *from, DBL *to, int32_t count) {
+    ptrdiff_t k = 0;
+    for (; k + complexes <= count; k += complexes)
+        ReversedComplex(Conjugate(Wide::load(from + 2 * k))).store(to - 2 * (k + complexes - 1));
+    for (; k < count; ++k) {
+        to[-2 * k] = from[2 * k];
+        to[-2 * k + 1] = -from[2 * k + 1];
+    }
+}
+
+} // namespace qx::QX_WIDTH
