@@ -39,12 +39,29 @@ bool Allocate(T *&table, int64_t count) {
     return table != nullptr;
 }
 
+// A table of this file alone, given back with the scope.
+struct TemporaryTable {
+    explicit TemporaryTable(int64_t count) : isThere(Allocate(data, count)) {}
+    ~TemporaryTable() { std::free(data); }
+    TemporaryTable(const TemporaryTable &) = delete;
+    TemporaryTable &operator=(const TemporaryTable &) = delete;
+
+    void release() {
+        std::free(data);
+        data = nullptr;
+    }
+
+    DBL *data = nullptr;
+    bool isThere;
+};
+
 // The powers of exp(-i theta) from the first up: each from the one before by a recurrence whose
 // error stays small because 1 - cos(theta), formed without cancellation, is small. What a rounding
 // takes from one power is handed on to the next, as in Kahan's summation (1965); without that the
 // errors of a hundred thousand steps add up to a hundred times that of one.
 class Roots {
 public:
+    Roots() = default;
     explicit Roots(double theta) : s_(-std::sin(theta)) {
         const double half = std::sin(theta * 0.5);
         c_ = 2.0 * half * half;
@@ -71,19 +88,29 @@ private:
     double imRest_ = 0.0;
 };
 
+constexpr ptrdiff_t columnsOfRoots = 32;
+
 bool BuildTwiddles(FFTStage *stage, int32_t p, int32_t n) {
     const ptrdiff_t m = n / p;
     const ptrdiff_t pitch = p - 1;
     if (!Allocate(stage->twiddleCos, (m - 1) * int64_t{pitch}) ||
         !Allocate(stage->twiddleSin, (m - 1) * int64_t{pitch}))
         return false;
+    // Several columns at a time, so that whole cache lines are written.
     const double step = kTwoPi / n;
-    for (int32_t j = 1; j < p; ++j) {
-        Roots roots(j * step);
-        for (ptrdiff_t k = 1; k < m; ++k) {
-            stage->twiddleCos[(k - 1) * pitch + (j - 1)] = roots.re;
-            stage->twiddleSin[(k - 1) * pitch + (j - 1)] = roots.im;
-            roots.advance();
+    for (ptrdiff_t first = 0; first < pitch; first += columnsOfRoots) {
+        const ptrdiff_t count = std::min(columnsOfRoots, pitch - first);
+        Roots columns[columnsOfRoots];
+        for (ptrdiff_t i = 0; i < count; ++i)
+            columns[i] = Roots(static_cast<double>(first + i + 1) * step);
+        for (ptrdiff_t k = 0; k < m - 1; ++k) {
+            DBL *const cosines = stage->twiddleCos + k * pitch + first;
+            DBL *const sines = stage->twiddleSin + k * pitch + first;
+            for (ptrdiff_t i = 0; i < count; ++i) {
+                cosines[i] = columns[i].re;
+                sines[i] = columns[i].im;
+                columns[i].advance();
+            }
         }
     }
     return true;
@@ -160,37 +187,41 @@ void BuildRaderOrders(FFTStage *stage, int32_t p) {
 // n values begins with those p - 1 and ends with the last p - 2 of them, so that every sum over
 // the orders wraps around as it does without padding.
 bool BuildRaderSpectrum(FFTStage *stage, int32_t p, int32_t n) {
-    DBL *temporary = nullptr;
-    DBL *work = nullptr;
-    if (!Allocate(temporary, 2 * int64_t{n}) || !Allocate(work, stage->raderPlan->complexWork)) {
-        std::free(temporary);
+    TemporaryTable ordered(2 * int64_t{n});
+    TemporaryTable spectrum(2 * int64_t{n}); // the roots, before
+    TemporaryTable work(stage->raderPlan->complexWork);
+    if (!ordered.isThere || !spectrum.isThere || !work.isThere)
         return false;
-    }
-    Fill(temporary, 2 * ptrdiff_t{n}, 0.0);
     Roots roots(kTwoPi / p);
-    for (int32_t t = 0; t < p - 1; ++t) {
-        stage->raderCos[t] = roots.re;
-        stage->raderSin[t] = roots.im;
+    for (ptrdiff_t t = 0; t < p - 1; ++t) {
+        spectrum.data[2 * t] = roots.re;
+        spectrum.data[2 * t + 1] = roots.im;
         roots.advance();
     }
+    Fill(ordered.data, 2 * ptrdiff_t{n}, 0.0);
     const double scale = 1.0 / n;
-    for (int32_t i = 0; i < p - 1; ++i) {
-        const int32_t root = stage->raderScatter[i + 1] - 1;
+    for (ptrdiff_t i = 0; i < p - 1; ++i) {
+        const ptrdiff_t root = stage->raderScatter[i + 1] - 1;
         const ptrdiff_t wrapped = i == 0 ? 0 : n - (p - 1) + i;
-        temporary[i] = temporary[wrapped] = stage->raderCos[root] * scale;
-        temporary[n + i] = temporary[n + wrapped] = stage->raderSin[root] * scale;
+        for (ptrdiff_t part = 0; part < 2; ++part)
+            ordered.data[2 * i + part] = ordered.data[2 * wrapped + part] =
+                spectrum.data[2 * root + part] * scale;
     }
-    ExecuteComplex(*stage->raderPlan, temporary, temporary + n, stage->raderCos, stage->raderSin, 1,
-                   1, work);
-    std::free(work);
-    std::free(temporary);
+    ExecuteComplex(*stage->raderPlan, ordered.data, ordered.data + 1, spectrum.data,
+                   spectrum.data + 1, 2, 2, work.data);
+    ordered.release(); // before more is taken
+    if (!Allocate(stage->raderCos, n) || !Allocate(stage->raderSin, n))
+        return false;
+    for (ptrdiff_t k = 0; k < n; ++k) {
+        stage->raderCos[k] = spectrum.data[2 * k];
+        stage->raderSin[k] = spectrum.data[2 * k + 1];
+    }
     return true;
 }
 
 bool BuildRader(FFTStage *stage, int32_t p) {
     const int32_t n = RaderLength(p);
-    if (!Allocate(stage->raderCos, n) || !Allocate(stage->raderSin, n) ||
-        !Allocate(stage->raderGather, p) || !Allocate(stage->raderScatter, p))
+    if (!Allocate(stage->raderGather, p) || !Allocate(stage->raderScatter, p))
         return false;
     stage->raderPlan = qx::create_oxfft_table(n);
     if (stage->raderPlan == nullptr)
