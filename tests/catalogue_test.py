@@ -38,7 +38,7 @@ QX_API ErrorCode Everything(QX_IN DBL1D x, QX_INOUT CDB2D m, QX_IN Interval1D in
                             QX_OUT I32_1D counts, int32_t n, QX_IN const int32_t *order,
                             QX_OUT DBL *value, QX_INOUT DBL *level, QX_INOUT PlanSlot *slot,
                             QX_INOUT InstanceWord *instance, QX_INOUT Interval *record,
-                            Function function, QX_OUT ErrorCode *err);
+                            Function function, QX_INOUT DBL1D *kept, QX_OUT ErrorCode *err);
 /**
  * Stars in the margin
  *   and an indented line.
@@ -79,7 +79,8 @@ class Reading(unittest.TestCase):
             ("value", "output", "DBL", "out"), ("level", "inout", "DBL", "inout"),
             ("slot", "slot", None, "inout"), ("instance", "instance", None, "inout"),
             ("record", "record", "Interval", "inout"), ("function", "procedure", None, "in"),
-            ("err", "error", "I32", "out")])
+            ("kept", "array1d", "DBL", "inout"), ("err", "error", "I32", "out")])
+        self.assertEqual([a["name"] for a in everything["arguments"] if a.get("byAddress")], ["kept"])
         self.assertEqual(everything["codes"], ["ErrEmptyInput", "ErrOutOfMemory", "WarnLengthsDiffer"])
         self.assertTrue(everything["hostStatus"] and everything["hasStatus"])
         self.assertFalse(forget["hasStatus"])

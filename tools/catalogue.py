@@ -225,9 +225,11 @@ def argument_of(words, types):
 
     if base in UNTYPED_HANDLES:
         raise ValueError(f"argument '{text}': a handle type that names its element is needed")
-    if base in types.handles and stars == 0:
+    if base in types.handles and stars <= 1:
         dimensions, argument["element"] = types.handles[base]
         argument["kind"] = f"array{dimensions}d"
+        if stars == 1:
+            argument["byAddress"] = True
     elif stars == 0 and base in SCALARS:
         if direction not in (None, "in"):
             raise ValueError(f"argument '{text}': a scalar by value is an input")

@@ -105,6 +105,8 @@ void PutField(Random &random, const std::string &element, Content content, const
         put(static_cast<float>(RealOf(random, content, at, constant)));
     else if (element == "U8")
         put(static_cast<uint8_t>(content == Content::RandomBits ? random.bits() : random.below(2)));
+    else if (ElementSize(element) == 2)
+        put(static_cast<int16_t>(WholeOf(random, content, at, static_cast<int32_t>(constant))));
     else
         put(static_cast<int32_t>(WholeOf(random, content, at, static_cast<int32_t>(constant))));
 }
@@ -178,7 +180,10 @@ int32_t TypeCode(const std::string &element) {
 std::size_t ElementSize(const std::string &element) {
     if (const auto record = AllRecords().find(element); record != AllRecords().end())
         return record->second.size;
-    return element == "DBL" ? 8 : element == "U8" ? 1 : 4;
+    return element == "DBL"                       ? 8
+           : element == "U8"                      ? 1
+           : element == "U16" || element == "I16" ? 2
+                                                  : 4;
 }
 
 std::vector<unsigned char> SomeElements(Random &random, const std::string &element, int32_t rows,

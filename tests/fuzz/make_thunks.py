@@ -12,10 +12,11 @@ KINDS = {"array1d": "Array1D", "array2d": "Array2D", "value": "Value", "referenc
 def is_driven(export, records):
     """Not those that take pointers to something whose content no catalogue tells, nor those that
     change the process: the fuzzer calls the exports of the workspace by itself."""
-    return "*" not in export["returns"] and all(a["kind"] in KINDS and a.get("element") != "WorkspaceStatus"
-               and all("*" not in f["type"] and "element" in f
-                       for f in records.get(a.get("element"), {"fields": []})["fields"])
-               for a in export["arguments"]) and not is_release(export)
+    return "*" not in export["returns"] and all(
+        a["kind"] in KINDS and "byAddress" not in a and a.get("element") != "WorkspaceStatus"
+        and all("*" not in f["type"] and "element" in f
+                for f in records.get(a.get("element"), {"fields": []})["fields"])
+        for a in export["arguments"]) and not is_release(export)
 
 
 def is_release(export):
@@ -42,7 +43,7 @@ def thunk(export):
     call = ", ".join(argument(a, i) for i, a in enumerate(export["arguments"]))
     call = f"{export['name']}({call})"
     body = f"{call}; return 0;" if export["returns"] == "void" else f"return static_cast<int32_t>({call});"
-    return f"int32_t Thunk_{export['name']}(const Value *v) {{ {body} }}\n"
+    return f"int32_t Thunk_{export['name']}([[maybe_unused]] const Value *v) {{ {body} }}\n"
 
 
 def table(export, exports):

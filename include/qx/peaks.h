@@ -1,0 +1,95 @@
+#ifndef QX_PEAKS_H
+#define QX_PEAKS_H
+
+/* Peaks and valleys of sampled data.
+
+   PeakD and its revisions fit a parabola to every window of `width` samples, by least squares, and
+   take its vertex where the slope changes its sign: a location between the samples, the amplitude
+   there and the second derivative. They work on a stream that comes in blocks. The caller keeps a
+   record and an array from call to call, and a peak on the seam of two blocks is found. Locations
+   count from the start of the stream. */
+
+#include "qx/types.h"
+
+QX_BEGIN_DECLS
+
+/* The bits of PeakDRequest.flags. */
+enum QXPeakFlags {
+    QXPeakFirstBlock = 1, /* starts a stream, whatever stood before */
+    QXPeakLastBlock = 4   /* scans the last window too, and releases the state */
+};
+
+/* A block of a stream, what is sought in it, and what is found. */
+typedef struct PeakDRequest {
+    DBL1D data;        /* at least `width` samples */
+    double threshold;  /* peaks lie above it, valleys below */
+    int32_t width;     /* samples of a window, from 3 */
+    int32_t polarity;  /* 0 peaks, 1 valleys */
+    DBL1D locations;   /* found: the sample numbers, with fractions */
+    DBL1D amplitudes;  /* found: the values of the parabolas there */
+    DBL1D derivatives; /* found: the second derivatives, per sample squared */
+    int32_t count;     /* found: how many */
+    uint32_t flags;    /* of QXPeakFlags */
+} PeakDRequest;
+
+/* Where a stream is; zeros at first and after its end. The pointers are into the state buffer as it
+   stood in the latest call; every call sets them anew. */
+typedef struct PeakDState {
+    int32_t width;
+    int32_t position;     /* windows so far: the sample number at which the next one starts */
+    int32_t historyCount; /* samples in the history, which is as long as a window */
+    int32_t tailCount;    /* samples of the latest block behind the history */
+    int32_t slopeSign;    /* 1 where the data rose in the last window, else 0 */
+    int32_t reserved;
+    DBL *fitMatrix; /* 3 rows of `width`: from a window to its parabola */
+    DBL *window;    /* `width` elements of work */
+    DBL *history;   /* the last `width` samples of the stream */
+    DBL *previous;  /* the 3 coefficients of the last window's parabola */
+    DBL *incoming;  /* the samples of the latest block behind the history */
+} PeakDState;
+
+/** Runs of samples at or above *threshold that are at least *width samples long: indices gets the
+    first sample of each, *count their number. NaN ends a run. The function result is the code, or
+    the host's status where it refused a resize.
+    Codes: ErrWidthOutOfRange (*width is below 1 or not below the size of x, as in an empty array),
+    ErrOutOfMemory (the host refused a resize). */
+QX_API int32_t PeakDetector(QX_IN DBL1D x, QX_IN const double *threshold,
+                            QX_IN const int32_t *width, QX_OUT I32_1D indices,
+                            QX_OUT int32_t *count, QX_OUT ErrorCode *err);
+
+/** As PeakD2014, with mode 0. */
+QX_API ErrorCode PeakD(QX_INOUT PeakDRequest *request, QX_INOUT PeakDState *state,
+                       QX_INOUT DBL1D *buffer, QX_OUT ErrorCode *err);
+/** As PeakD2014, without a source: mode 2 has no data. */
+QX_API ErrorCode PeakD2010(QX_INOUT PeakDRequest *request, QX_INOUT PeakDState *state,
+                           QX_INOUT DBL1D *buffer, QX_OUT ErrorCode *err, int32_t mode);
+
+/** The peaks or valleys of the next block of a stream. With t from the centre of a window of w
+    samples, the parabola c0 + c1 t + c2 t^2 of every window is computed, and refined to its vertex
+    -c1 / (2 c2) where c1 changes its sign from one window to the next; for w below 5 in every
+    window whose c2 has the sign that is sought. A vertex counts that lies within a quarter of the
+    window from its centre and whose amplitude lies beyond the threshold, both in one of the two
+    windows. Of two less than a sample apart the more extreme one stays. The blocks that a stream comes
+    in change nothing but this: where the second of such two is more extreme and lies behind a seam,
+    both are told. The last w samples of a block are scanned with the next one, or with the last-block
+    flag.
+
+    mode 0 and 1 scan request->data; mode 2 scans `source`, and request->data plays no part. Modes 1
+    and 2 look for flat blocks: where the block and its history span less than 1e-8, their mean is
+    subtracted, in mode 1 in the caller's array, which stays changed, and every window is scaled to
+    1 before its parabola is fitted.
+
+    *buffer gets 5 w + 3 elements with the first block. The last block and every failure empty it
+    and clear the state, so that the next call must start a stream. The code stands in *err as well.
+    Codes: ErrOutOfMemory (no memory, or the host refused a resize), ErrInvalidSelector (w below 3
+    or above 1073741824, or no such mode or polarity), ErrStateSizeMismatch (not the first block and
+    the state is of another width), ErrNoUsableFit (buffer is null), ErrWidthOutOfRange (a block of
+    less than w samples), ErrOverflow (2^31 windows in one stream), ErrIterationLimit (the
+    operator of the window cannot be computed). */
+QX_API ErrorCode PeakD2014(QX_IN DBL1D source, QX_INOUT PeakDRequest *request,
+                           QX_INOUT PeakDState *state, QX_INOUT DBL1D *buffer,
+                           QX_OUT ErrorCode *err, int32_t mode);
+
+QX_END_DECLS
+
+#endif

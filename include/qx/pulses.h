@@ -1,0 +1,190 @@
+#ifndef QX_PULSES_H
+#define QX_PULSES_H
+
+/* Levels, pulses, cycles and transitions of a waveform y, sampled every dt from t0 on.
+
+   A waveform stays mostly in two states, whose levels come from its histogram or its extremes.
+   Reference levels, as percentages of the amplitude above the low state or as absolute values, cut
+   it into transitions; times are interpolated between samples. IEEE Std 181 has the same terms.
+
+   The counters of the histogram are kept from call to call in a slot: a word of the caller's, null
+   at first, of which the host is told so that it can clean up. An _IDP export keeps them in the
+   host's instance data, which MeasurementUnreserveProc gives back, and is otherwise its twin.
+
+   NaN belongs to no state. Numeric results are 0 after a failure. `limit` is 0 or 1: with 1 the
+   automatic method takes both levels from the histogram or neither, and the regions of aberrations
+   end three times the transition's duration away from it. */
+
+#include "qx/types.h"
+
+QX_BEGIN_DECLS
+
+/* How the levels of the states are found. */
+enum QXLevelMethod {
+    QXLevelsByHistogram = 0, /* the fullest bins of the lowest and of the highest two fifths */
+    QXLevelsByPeaks = 1,     /* minimum and maximum */
+    QXLevelsAutomatic = 2 /* the histogram where its bins hold over 5% of the samples, else peaks */
+};
+
+typedef struct HistogramOptions {
+    uint32_t method; /* of QXLevelMethod */
+    int32_t bins;    /* from 1 */
+} HistogramOptions;
+
+/* The levels that begin and end pulses and transitions. */
+typedef struct ReferenceLevels {
+    double high;
+    double mid;
+    double low;
+    uint16_t
+        percent; /* 0: absolute values; else percentages of the amplitude above the low state */
+} ReferenceLevels;
+
+/* A word of the caller's in which an export keeps its counters from call to call; null at first. */
+typedef void *MeasurementSlot;
+/* The word that the host keeps for a call node, for the _IDP exports; null at first. */
+typedef void *MeasurementInstanceWord;
+
+/** The levels of the two states and their difference.
+    Codes: ErrMeasureNullState (a pointer is null), ErrMeasureEmptyChannel (bins below 1),
+    ErrMeasureTooManyChannels (unknown method), ErrOutOfMemory (no memory for the counters),
+    ErrMeasureEmpty (y is empty), ErrMeasureLevelsReversed (dt is not above 0), ErrInvalidSelector
+    (limit is neither 0 nor 1), ErrMeasureNotPositive (y is flat, which peaks allow, has no numbers,
+    or spans more than a number can), WarnMeasurePartial (by histogram: the bin of a state holds
+    fewer than 5% of the samples; the results stand). */
+QX_API ErrorCode StateLevels(QX_IN DBL1D y, double t0, double dt, int32_t method, int32_t bins,
+                             QX_INOUT MeasurementSlot *slot, QX_OUT double *high,
+                             QX_OUT double *low, QX_OUT double *amplitude, int32_t limit);
+/** As StateLevels, with its counters in the host's instance data. */
+QX_API ErrorCode StateLevels_IDP(QX_IN DBL1D y, double t0, double dt, int32_t method, int32_t bins,
+                                 QX_INOUT MeasurementInstanceWord *instance, QX_OUT double *high,
+                                 QX_OUT double *low, QX_OUT double *amplitude, int32_t limit);
+
+/** Pulse number `pulseNumber` (from 1) whose first edge falls (polarity 0) or rises (1): it lies
+    between two successive crossings of the mid reference, and a crossing counts once the waveform
+    has left the band around mid that reaches to the nearer of the other references. In units of
+    time: the duration, the center, and the period between the crossings of number
+    2 pulseNumber - 1 and 2 pulseNumber + 1 of the waveform; dutyCycle = duration / period. With
+    `partial` the last crossing of the period may be missing; period and dutyCycle are then 0, as
+    they always are with it. Levels are computed only for references in percent, which come out as
+    absolute values.
+    Codes: ErrMeasureNullState (a pointer is null), ErrMeasureEmptyChannel (bins below 1),
+    ErrMeasureTooManyChannels (unknown method), ErrOutOfMemory (no memory for the counters),
+    ErrMeasureBadCount (pulseNumber below 1), ErrMeasureEmpty (y is empty),
+    ErrMeasureLevelsReversed (dt is not above 0), ErrInvalidSelector (limit or polarity is neither 0
+    nor 1), ErrMeasureNotPositive (no amplitude, as in StateLevels), ErrMeasureRangeReversed (the
+    references are out of order), ErrMeasureOutOfMemory (no memory for so many crossings),
+    ErrMeasureSearchShort (too few crossings), WarnMeasurePartial (as in StateLevels). */
+QX_API ErrorCode PulseMeasEx(QX_IN DBL1D y, double t0, double dt, uint16_t polarity,
+                             uint16_t partial, int32_t pulseNumber,
+                             QX_IN const ReferenceLevels *ref, QX_IN const HistogramOptions *hist,
+                             QX_INOUT MeasurementSlot *slot, QX_OUT double *period,
+                             QX_OUT double *duration, QX_OUT double *dutyCycle,
+                             QX_OUT double *center, QX_OUT double *lowRef, QX_OUT double *midRef,
+                             QX_OUT double *highRef, int32_t limit);
+/** As PulseMeasEx, with its counters in the host's instance data. */
+QX_API ErrorCode PulseMeasEx_IDP(QX_IN DBL1D y, double t0, double dt, uint16_t polarity,
+                                 uint16_t partial, int32_t pulseNumber,
+                                 QX_IN const ReferenceLevels *ref,
+                                 QX_IN const HistogramOptions *hist,
+                                 QX_INOUT MeasurementInstanceWord *instance, QX_OUT double *period,
+                                 QX_OUT double *duration, QX_OUT double *dutyCycle,
+                                 QX_OUT double *center, QX_OUT double *lowRef,
+                                 QX_OUT double *midRef, QX_OUT double *highRef, int32_t limit);
+/** As PulseMeasEx, of whole periods only. */
+QX_API ErrorCode PulseMeas(QX_IN DBL1D y, double t0, double dt, uint16_t polarity,
+                           int32_t pulseNumber, QX_IN const ReferenceLevels *ref,
+                           QX_IN const HistogramOptions *hist, QX_INOUT MeasurementSlot *slot,
+                           QX_OUT double *period, QX_OUT double *duration, QX_OUT double *dutyCycle,
+                           QX_OUT double *center, QX_OUT double *lowRef, QX_OUT double *midRef,
+                           QX_OUT double *highRef, int32_t limit);
+
+/** Falling (polarity 0) or rising (1) transition number `number` (from 1) between the low and the
+    high reference: start, end and duration in units of time, and slewRate, the difference of the
+    references by the duration. Aberrations are the excursions from the state before and behind the
+    transition, up to half the way to the neighbouring transitions or to the ends of the waveform,
+   in percent of the amplitude; an overshoot lies above the state's bin of the histogram, an
+   undershoot below it, and inside it there is none. Afterwards `ref` has absolute levels, and its
+   `percent` as it was; a failure leaves it. Codes: ErrMeasureNullState (a pointer is null),
+   ErrMeasureEmptyChannel (bins below 1), ErrMeasureTooManyChannels (unknown method), ErrOutOfMemory
+   (no memory for the counters), ErrMeasureBadCount (number below 1), ErrMeasureEmpty (y is empty),
+   ErrMeasureLevelsReversed (dt is not above 0), ErrInvalidSelector (limit or polarity is neither 0
+   nor 1), ErrMeasureNotPositive (no amplitude, as in StateLevels and for peaks as well),
+   ErrMeasureRangeReversed (the references are out of order), ErrMeasureOutOfMemory (no memory for
+   so many transitions), ErrMeasureTooFewPoints (there is no such transition), ErrMeasureOutOfRange
+   (the duration is not above 0), WarnMeasurePartial (as in StateLevels, for peaks as well). */
+QX_API ErrorCode TransMeas(QX_IN DBL1D y, double t0, double dt, uint16_t polarity, int32_t number,
+                           QX_INOUT ReferenceLevels *ref, QX_IN const HistogramOptions *hist,
+                           QX_INOUT MeasurementSlot *slot, QX_OUT double *slewRate,
+                           QX_OUT double *duration, QX_OUT double *start, QX_OUT double *end,
+                           QX_OUT double *lowRef, QX_OUT double *midRef, QX_OUT double *highRef,
+                           QX_OUT double *preUndershoot, QX_OUT double *preOvershoot,
+                           QX_OUT double *postUndershoot, QX_OUT double *postOvershoot,
+                           int32_t limit);
+/** As TransMeas, with its counters in the host's instance data. */
+QX_API ErrorCode TransMeas_IDP(QX_IN DBL1D y, double t0, double dt, uint16_t polarity,
+                               int32_t number, QX_INOUT ReferenceLevels *ref,
+                               QX_IN const HistogramOptions *hist,
+                               QX_INOUT MeasurementInstanceWord *instance, QX_OUT double *slewRate,
+                               QX_OUT double *duration, QX_OUT double *start, QX_OUT double *end,
+                               QX_OUT double *lowRef, QX_OUT double *midRef, QX_OUT double *highRef,
+                               QX_OUT double *preUndershoot, QX_OUT double *preOvershoot,
+                               QX_OUT double *postUndershoot, QX_OUT double *postOvershoot,
+                               int32_t limit);
+
+/** Mean and root mean square over cycle number `cycleNumber` (from 1), between the crossings of
+    number 2 cycleNumber - 1 and 2 cycleNumber + 1 of the mid reference as PulseMeasEx counts them,
+    over whole samples; start and end in units of time. Afterwards `ref` has absolute levels, and
+   its `percent` as it was; a failure leaves it. Codes: ErrMeasureNullState (a pointer is null),
+   ErrMeasureEmptyChannel (bins below 1), ErrMeasureTooManyChannels (unknown method), ErrOutOfMemory
+   (no memory for the counters), ErrMeasureBadCount (cycleNumber below 1), ErrMeasureEmpty (y is
+   empty), ErrMeasureLevelsReversed (dt is not above 0), ErrInvalidSelector (limit is neither 0 nor
+   1), ErrMeasureNotPositive (no amplitude, as in StateLevels), ErrMeasureRangeReversed (the
+   references are out of order), ErrMeasureOutOfMemory (no memory for so many crossings),
+   ErrMeasureSearchShort (too few crossings), ErrMeasureNotFound (a cycle of no samples),
+   WarnMeasurePartial (as in StateLevels). */
+QX_API ErrorCode CycleRMSAverage(QX_IN DBL1D y, double t0, double dt, int32_t cycleNumber,
+                                 QX_INOUT ReferenceLevels *ref, QX_IN const HistogramOptions *hist,
+                                 QX_INOUT MeasurementSlot *slot, QX_OUT double *mean,
+                                 QX_OUT double *rms, QX_OUT double *start, QX_OUT double *end,
+                                 QX_OUT double *lowRef, QX_OUT double *midRef,
+                                 QX_OUT double *highRef, int32_t limit);
+/** As CycleRMSAverage, with its counters in the host's instance data. */
+QX_API ErrorCode CycleRMSAverage_IDP(QX_IN DBL1D y, double t0, double dt, int32_t cycleNumber,
+                                     QX_INOUT ReferenceLevels *ref,
+                                     QX_IN const HistogramOptions *hist,
+                                     QX_INOUT MeasurementInstanceWord *instance,
+                                     QX_OUT double *mean, QX_OUT double *rms, QX_OUT double *start,
+                                     QX_OUT double *end, QX_OUT double *lowRef,
+                                     QX_OUT double *midRef, QX_OUT double *highRef, int32_t limit);
+
+/** The first pulse of a waveform in units of samples: base and top, the fullest bins from below and
+    from above of a histogram of 101 bins, amplitude = top - base, overshoot = max - top, undershoot
+    = base - min; delay, the first crossing of 50% of the amplitude; width, from there to the next;
+    riseTime and fallTime between 10% and 90%; slewRate = 0.8 amplitude / riseTime, 1e30 where that
+    divides by 0. A waveform that starts above 50% holds a negative pulse: top and base are
+    exchanged, the amplitude is negative, and the times are those of the waveform turned over;
+    overshoot stays what lies above the upper level, undershoot what lies below the lower one. What
+    the waveform does not reach counts as its last sample in delay and width, and as its end, counted
+    from the last sample before the missing edge, in riseTime and fallTime. The function result is 0.
+    Codes: ErrEmptyInput (y is empty). */
+QX_API int32_t PulseParameters(QX_IN DBL1D y, QX_OUT double *top, QX_OUT double *base,
+                               QX_OUT double *amplitude, QX_OUT double *delay, QX_OUT double *width,
+                               QX_OUT double *slewRate, QX_OUT double *fallTime,
+                               QX_OUT double *riseTime, QX_OUT double *overshoot,
+                               QX_OUT double *undershoot, QX_OUT ErrorCode *err);
+
+/** Gives the counters of an _IDP node back and clears its instance-data word. Null is allowed.
+    Codes: none. */
+QX_API ErrorCode MeasurementUnreserveProc(QX_INOUT MeasurementInstanceWord *instance);
+
+/** Has no effect: the measurements need no preparation. */
+QX_API void measurements_create(void);
+/** As measurements_create. */
+QX_API void measurements_destroy(void);
+/** As measurements_create. */
+QX_API void measurements_clear(void);
+
+QX_END_DECLS
+
+#endif

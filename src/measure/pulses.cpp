@@ -1,0 +1,271 @@
+#include "measure/pulses.h"
+
+#include "frame/scratch.h"
+
+#include <algorithm>
+#include <cmath>
+
+namespace qx {
+
+namespace {
+
+bool IsDirection(int32_t direction) { return direction == falling || direction == rising; }
+
+// A list of `2 number + 1` entries: the period or transition asked for, whichever way the waveform
+// begins, and the entry behind it.
+template <class Entry>
+class List {
+public:
+    ErrorCode allocate(int32_t number) {
+        const int64_t length = 2 * int64_t{number} + 1;
+        return memory_.allocate(length * int64_t{sizeof(Entry)}) ? ErrMeasureOutOfMemory : 0;
+    }
+    Entry *data() const { return static_cast<Entry *>(memory_.bytes()); }
+    const Entry &operator[](int32_t i) const { return data()[i]; }
+
+    // The place of the entry of this number in a direction, or `count`.
+    int32_t find(int32_t number, int32_t direction, int32_t count) const {
+        int32_t place = 0;
+        for (; place < count; ++place)
+            if (data()[place].direction == direction && --number == 0)
+                break;
+        return place;
+    }
+
+private:
+    ScratchBytes memory_;
+};
+
+ErrorCode SelectPulse(const Waveform &waveform, double h, int32_t direction, bool mayBePartial,
+                      int32_t number, double mid, PulseFound *found) {
+    List<Crossing> list;
+    if (const ErrorCode failed = list.allocate(number))
+        return failed;
+    const int32_t wanted = 2 * number + 1; // fits, since the list does
+    const int32_t count =
+        FindMidCrossings(waveform.t0, waveform.y, waveform.n, mid, h, list.data(), wanted);
+    const bool isEnough = count == wanted || (mayBePartial && count == wanted - 1 &&
+                                              list[count - 1].direction != direction);
+    if (!isEnough)
+        return ErrMeasureSearchShort;
+    const int32_t first =
+        direction == either ? 2 * number - 2 : list.find(number, direction, count);
+    if (first + 1 >= count) // only with NaN among the samples do directions not alternate
+        return ErrMeasureSearchShort;
+
+    const double begin = list[first].position;
+    const double end = list[first + 1].position;
+    *found = {0, end - begin, 0, (begin + end) * 0.5};
+    if (!mayBePartial) {
+        // kept: the period counts by the place in the list, whichever edges the pulse has.
+        found->period = list[2 * number].position - list[2 * number - 2].position;
+        found->dutyCycle = found->duration / found->period;
+    }
+    const double dt = waveform.dt;
+    found->duration *= dt;
+    found->period *= dt;
+    found->center = (found->center - waveform.t0) * dt + waveform.t0;
+    return 0;
+}
+
+// A state's level and the bin of the histogram around it.
+struct StateBand {
+    double level, lower, upper;
+    bool isHigh;
+
+    StateBand(double stateLevel, double bin, bool high)
+        : level(stateLevel), lower(stateLevel - bin / 2), upper(lower + bin), isHigh(high) {}
+    bool isReachedBy(double y) const { return isHigh ? !(y < level) : !(y > level); }
+};
+
+struct Aberration {
+    double under, over;
+};
+
+// Of y[first..last], in percent of the amplitude.
+Aberration AberrationIn(const DBL *y, int32_t first, int32_t last, const StateBand &state,
+                        double amplitude) {
+    double max = y[first];
+    double min = max;
+    for (int32_t i = first + 1; i <= last; ++i) {
+        max = y[i] > max ? y[i] : max;
+        min = y[i] < min ? y[i] : min;
+    }
+    return {min < state.lower ? (state.level - min) * 100 / amplitude : 0.0,
+            max > state.upper ? (max - state.level) * 100 / amplitude : 0.0};
+}
+
+// What the regions of aberrations are bounded by.
+struct Neighbours {
+    const Transition *before, *behind; // null at an end of the waveform
+    int64_t reach;                     // in samples; the waveform's length where there is no limit
+};
+
+int32_t Middle(int32_t a, int32_t b) { return a + (b - a) / 2; }
+
+Aberration BeforeTransition(const Waveform &waveform, const Transition &transition,
+                            const Neighbours &neighbours, const StateBand &state,
+                            double amplitude) {
+    const int32_t start = transition.startIndex;
+    const int32_t half = neighbours.before ? Middle(neighbours.before->endIndex, start) : 0;
+    const auto first = static_cast<int32_t>(std::max<int64_t>(half, start - neighbours.reach));
+    int32_t last = start;
+    while (last > first + 1 && !state.isReachedBy(waveform.y[last]))
+        --last;
+    return AberrationIn(waveform.y, first, last, state, amplitude);
+}
+
+Aberration BehindTransition(const Waveform &waveform, const Transition &transition,
+                            const Neighbours &neighbours, const StateBand &state,
+                            double amplitude) {
+    const int32_t end = transition.endIndex;
+    const int32_t half =
+        neighbours.behind ? Middle(end, neighbours.behind->startIndex) : waveform.n - 1;
+    const auto last = static_cast<int32_t>(std::min<int64_t>(half, end + neighbours.reach));
+    int32_t first = end;
+    while (first < last && !state.isReachedBy(waveform.y[first]))
+        ++first;
+    return AberrationIn(waveform.y, first, last, state, amplitude);
+}
+
+// The levels of a transition's states: in the end always of the histogram, unless one of the
+// automatic method's extremes stands for a state.
+ErrorCode TransitionLevels(const Waveform &waveform, const LevelSearch &search,
+                           ReferenceLevels *references, StateLevelsFound *levels) {
+    ErrorCode status = ComputeLevels(waveform, search, levels);
+    if (status < 0)
+        return status;
+    if (references->percent)
+        MakeAbsolute(*levels, references);
+    if (!(references->low <= references->mid && references->mid <= references->high))
+        return ErrMeasureRangeReversed;
+    const bool isByPeaks = levels->chosen == QXLevelsByPeaks;
+    if (isByPeaks && !(levels->amplitude > 0))
+        return ErrMeasureNotPositive;
+    if (isByPeaks || (levels->chosen == QXLevelsAutomatic && search.isStrict())) {
+        const ErrorCode warning = TakeHistogramLevels(waveform, search, !isByPeaks, levels);
+        status = Merge(status, warning);
+    }
+    // A single bin has both states.
+    return levels->amplitude > 0 ? status : ErrMeasureNotPositive;
+}
+
+void MeasureAberrations(const Waveform &waveform, const LevelSearch &search,
+                        const StateLevelsFound &levels, const List<Transition> &list, int32_t place,
+                        int32_t count, TransitionFound *found) {
+    const Transition &transition = list[place];
+    const int32_t length = std::max(1, transition.endIndex - transition.startIndex);
+    const Neighbours neighbours = {place > 0 ? &list[place - 1] : nullptr,
+                                   place + 1 < count ? &list[place + 1] : nullptr,
+                                   search.isStrict() ? 3 * int64_t{length} : waveform.n};
+    const double bin = levels.range / search.bins;
+    const StateBand low(levels.low, bin, false);
+    const StateBand high(levels.high, bin, true);
+    const bool rises = transition.direction == rising;
+    const Aberration pre =
+        BeforeTransition(waveform, transition, neighbours, rises ? low : high, levels.amplitude);
+    const Aberration post =
+        BehindTransition(waveform, transition, neighbours, rises ? high : low, levels.amplitude);
+    found->preUndershoot = pre.under;
+    found->preOvershoot = pre.over;
+    found->postUndershoot = post.under;
+    found->postOvershoot = post.over;
+}
+
+// From a time in samples, rounded, into [0, most].
+int32_t Rounded(double samples, int32_t most) {
+    const double rounded = std::trunc(samples + 0.5);
+    return rounded > 0 ? static_cast<int32_t>(std::min<double>(rounded, most)) : 0;
+}
+
+} // namespace
+
+ErrorCode MeasurePulse(const Waveform &waveform, const LevelSearch &search, int32_t direction,
+                       bool mayBePartial, int32_t number, ReferenceLevels *references,
+                       PulseFound *found) {
+    if (number < 1)
+        return ErrMeasureBadCount;
+    if (const ErrorCode failed = CheckWaveform(waveform, search.limit))
+        return failed;
+    if (direction != either && !IsDirection(direction))
+        return ErrInvalidSelector;
+    ErrorCode status = 0;
+    if (references->percent) {
+        StateLevelsFound levels;
+        status = ComputeLevels(waveform, search, &levels);
+        if (status < 0)
+            return status;
+        MakeAbsolute(levels, references);
+    }
+    const double h =
+        std::min(references->mid - references->low, references->high - references->mid);
+    if (!(h >= 0))
+        return ErrMeasureRangeReversed;
+    const ErrorCode failed =
+        SelectPulse(waveform, h, direction, mayBePartial, number, references->mid, found);
+    return failed ? failed : status;
+}
+
+ErrorCode MeasureCycle(const Waveform &waveform, const LevelSearch &search, int32_t number,
+                       ReferenceLevels *references, CycleFound *found) {
+    PulseFound pulse;
+    const ErrorCode status =
+        MeasurePulse(waveform, search, either, false, number, references, &pulse);
+    if (status < 0)
+        return status;
+    found->start = pulse.center - pulse.duration / 2;
+    found->end = found->start + pulse.period;
+    // Far from 0 the times are rounded, so the samples are held within the waveform.
+    const int32_t count = Rounded(pulse.period / waveform.dt, waveform.n);
+    if (count == 0)
+        return ErrMeasureNotFound;
+    const int32_t first = Rounded((found->start - waveform.t0) / waveform.dt, waveform.n - count);
+    double sum = 0;
+    double squares = 0;
+    for (int32_t i = first; i < first + count; ++i) {
+        sum += waveform.y[i];
+        squares += waveform.y[i] * waveform.y[i];
+    }
+    found->mean = sum / count;
+    found->rms = std::sqrt(squares / count);
+    return status;
+}
+
+ErrorCode MeasureTransition(const Waveform &waveform, const LevelSearch &search, int32_t direction,
+                            int32_t number, ReferenceLevels *references, TransitionFound *found) {
+    if (number < 1)
+        return ErrMeasureBadCount;
+    if (const ErrorCode failed = CheckWaveform(waveform, search.limit))
+        return failed;
+    if (!IsDirection(direction))
+        return ErrInvalidSelector;
+    StateLevelsFound levels;
+    const ErrorCode status = TransitionLevels(waveform, search, references, &levels);
+    if (status < 0)
+        return status;
+    List<Transition> list;
+    if (const ErrorCode failed = list.allocate(number))
+        return failed;
+    int32_t count;
+    if (const ErrorCode failed =
+            FindTransitions(waveform.y, waveform.n, references->low, references->high, list.data(),
+                            2 * number + 1, &count))
+        return failed;
+    const int32_t place = list.find(number, direction, count);
+    if (place == count)
+        return ErrMeasureTooFewPoints;
+
+    MeasureAberrations(waveform, search, levels, list, place, count, found);
+    const double start = list[place].startPosition;
+    const double end = list[place].endPosition;
+    const double duration = end - start;
+    if (!(duration > 0))
+        return ErrMeasureOutOfRange;
+    found->slewRate = (references->high - references->low) / duration / waveform.dt;
+    found->duration = duration * waveform.dt;
+    found->start = start * waveform.dt + waveform.t0;
+    found->end = end * waveform.dt + waveform.t0;
+    return status;
+}
+
+} // namespace qx

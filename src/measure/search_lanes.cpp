@@ -1,0 +1,89 @@
+#include "measure/search.h"
+
+#include "frame/lanes.h"
+
+namespace qx::QX_WIDTH {
+namespace {
+
+typedef Lanes<nativeLanes> L;
+constexpr int together = 4; // vectors that are looked at before a branch
+constexpr int32_t stride = together * nativeLanes;
+
+template <class Mask>
+QX_INLINE unsigned BitsOf(Mask mask) {
+#ifdef __AVX2__
+    return static_cast<unsigned>(__builtin_ia32_movmskpd256(reinterpret_cast<L::Vector>(mask)));
+#else
+    return static_cast<unsigned>(__builtin_ia32_movmskpd(reinterpret_cast<L::Vector>(mask)));
+#endif
+}
+
+// Each test once for a sample and once for those of a vector.
+struct Beyond {
+    const DBL *y;
+    double lower, upper;
+
+    QX_INLINE bool one(int32_t i) const { return y[i] <= lower || y[i] >= upper; }
+    QX_INLINE auto many(int32_t i) const {
+        const L here = L::load(y + i);
+        return (here.v <= L(lower).v) | (here.v >= L(upper).v);
+    }
+};
+
+struct BeyondOrCrossing {
+    Beyond beyond;
+    double levelA, levelB;
+
+    static QX_INLINE bool crosses(double here, double next, double level) {
+        return (here <= level && next >= level) || (here >= level && next <= level);
+    }
+    static QX_INLINE auto crosses(L here, L next, L level) {
+        return ((here.v <= level.v) & (next.v >= level.v)) |
+               ((here.v >= level.v) & (next.v <= level.v));
+    }
+    QX_INLINE bool one(int32_t i) const {
+        const double here = beyond.y[i], next = beyond.y[i + 1];
+        return beyond.one(i) || crosses(here, next, levelA) || crosses(here, next, levelB);
+    }
+    QX_INLINE auto many(int32_t i) const {
+        const L here = L::load(beyond.y + i), next = L::load(beyond.y + i + 1);
+        return beyond.many(i) | crosses(here, next, L(levelA)) | crosses(here, next, L(levelB));
+    }
+};
+
+template <class Test>
+QX_INLINE int32_t First(int32_t from, int32_t end, const Test &test) {
+    // The next event of a lively waveform is near, and a vector would look too far.
+    int32_t i = from;
+    for (const int32_t near = end - from < 6 ? end : from + 6; i < near; ++i)
+        if (test.one(i))
+            return i;
+    for (; end - i >= stride; i += stride) {
+        auto any = test.many(i);
+        for (int k = 1; k < together; ++k)
+            any |= test.many(i + k * nativeLanes);
+        if (__builtin_expect(BitsOf(any) != 0, 0)) {
+            unsigned bits = 0;
+            for (int k = 0; k < together; ++k)
+                bits |= BitsOf(test.many(i + k * nativeLanes)) << (k * nativeLanes);
+            return i + __builtin_ctz(bits);
+        }
+    }
+    for (; i < end; ++i)
+        if (test.one(i))
+            return i;
+    return end;
+}
+
+} // namespace
+
+int32_t FirstBeyond(const DBL *y, int32_t from, int32_t end, double lower, double upper) {
+    return First(from, end, Beyond{y, lower, upper});
+}
+
+int32_t FirstBeyondOrCrossing(const DBL *y, int32_t from, int32_t end, double lower, double upper,
+                              double levelA, double levelB) {
+    return First(from, end, BeyondOrCrossing{{y, lower, upper}, levelA, levelB});
+}
+
+} // namespace qx::QX_WIDTH
