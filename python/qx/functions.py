@@ -107,7 +107,7 @@ class Writer:
         self.before, self.given, self.after, self.results = [], [], [], []
         self.status = "_result" if entry["returns"] == "ErrorCode" else None
         self.types = []  # of the arguments in C
-        self.names = {"__name__": "qx", "_byref": ctypes.byref, "_tell": tell, "_whole": whole,
+        self.names = {"__name__": "qx", "_byref": ctypes.byref, "_c_void_p": ctypes.c_void_p, "_tell": tell, "_whole": whole,
                       "_real": real, "_c_number": c_number, "_word": plans.word, "_Record": Record,
                       "_address": address, "_pointer": pointer, "_buffer": buffer, "_many": many,
                       "_mapped": mapped, "_procedure": procedure,
@@ -133,7 +133,9 @@ class Writer:
         else:
             self.before.append(f"_{i} = _kind{i}.given({name}, {place})")
             self.after.append(f"_kind{i}.give_back(_{i})")
-        self._pass(f"_{i}.handle")
+        if argument.get("byAddress"):
+            self.before.append(f"_handle{i} = _c_void_p(_{i}.handle)")
+        self._pass(f"_byref(_handle{i})" if argument.get("byAddress") else f"_{i}.handle")
 
     def _pass(self, text, c_type=ctypes.c_void_p):
         self.given.append(text)

@@ -10,13 +10,18 @@ from .library import library
 from .scalars import C_TYPES, COMPLEX, c_number, shown
 
 
+def is_pointer(field):
+    """A pointer into an array of the caller's: the export sets it anew at every call."""
+    return field["type"].endswith("*") and "array" not in field
+
+
 @functools.lru_cache(maxsize=None)
 def record_type(name):
     """The ctypes structure of a record; arrays in it are handles."""
     description = library().records[name]
     fields = []
     for field in description["fields"]:
-        if "array" in field:
+        if "array" in field or is_pointer(field):
             fields.append((field["name"], ctypes.c_void_p))
         elif "element" in field and str(field.get("count", "1")).isdigit():
             c_type = C_TYPES[field["element"]]
@@ -36,7 +41,8 @@ class Record:
     def __init__(self, name, contents, place):
         self.record = record_type(name)()
         self.blocks = {}
-        self.fields = {field["name"]: field for field in library().records[name]["fields"]}
+        self.fields = {field["name"]: field for field in library().records[name]["fields"]
+                       if not is_pointer(field)}
         try:
             contents = dict({} if contents is None else contents)
         except (TypeError, ValueError):

@@ -345,8 +345,9 @@ def power(recording):
 # Families with sections of their own; they take the above from here.
 from .sections_cleaning import cleaned  # noqa: E402
 from .sections_filtering import filtered  # noqa: E402
+from .sections_measuring import events  # noqa: E402
 
-SECTIONS = [overview, statistics, histogram, amplitudes, power, filtered, cleaned]
+SECTIONS = [overview, statistics, histogram, amplitudes, power, filtered, cleaned, events]
 
 
 # Output

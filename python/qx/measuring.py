@@ -1,0 +1,168 @@
+"""Peaks, repeated events such as heart beats, and pulses of a recording.
+
+Places are sample numbers with fractions; whoever shows them turns them into times.
+"""
+
+import bisect
+import dataclasses
+
+import numpy as np
+
+from .calls import call
+from .outcomes import QxError
+
+WHOLE_STREAM = 5  # first and last block
+AUTOMATIC, BINS = 2, 100
+FALLING, RISING = 0, 1
+REFERENCES = {"high": 90.0, "mid": 50.0, "low": 10.0, "percent": 1}
+
+
+# Peaks
+
+@dataclasses.dataclass
+class Peaks:
+    places: np.ndarray
+    values: np.ndarray
+    curvatures: np.ndarray  # second derivatives, per sample squared
+    threshold: float
+
+
+def middle_threshold(values, valleys=False):
+    """Half the way from the median to where the outer hundredth of the values begins."""
+    outer = np.quantile(values, 0.01 if valleys else 0.99)
+    return (call("Median_head", values) + outer) / 2
+
+
+def peaks(values, threshold=None, width=5, valleys=False):
+    """The peaks above the threshold, or the valleys below it, by parabolas over `width` samples."""
+    if threshold is None:
+        threshold = middle_threshold(values, valleys)
+    request = {"data": values, "threshold": threshold, "width": width, "polarity": int(valleys),
+               "flags": WHOLE_STREAM}
+    found = call("PeakD", request, {}, [])[0]
+    return Peaks(found["locations"], found["amplitudes"], found["derivatives"], threshold)
+
+
+# Events
+
+EVENT_SECONDS = 0.1  # what lasts about so long, such as the steep part of a heart beat
+EVENT_SAMPLES = 36  # where the rate is not known
+STEPS = 6  # of the activity in that time
+REFRACTORY = 2.5  # events follow each other no faster, in its multiples
+
+
+def activity(values, step):
+    """The root mean square slope of the values around every `step`-th sample, by the largest slope."""
+    means = call("DecimateCIN", values, step, 1)
+    slopes = call("Derivative", means, means[0], means[-1], 1.0)
+    power = call("Convolution", (slopes / (np.abs(slopes).max() or 1.0))**2, np.full(STEPS, 1 / STEPS), 0)
+    # A moving mean over an even number: half a step late.
+    return np.sqrt(np.maximum(power[STEPS // 2:][:len(slopes)], 0))
+
+
+def separated(places, strengths, apart):
+    """The places without those to which a stronger one is nearer than `apart`."""
+    kept = []
+    for i in np.argsort(-strengths, kind="stable"):
+        at = bisect.bisect(kept, places[i])
+        if all(abs(places[i] - near) >= apart for near in kept[max(0, at - 1):at + 1]):
+            kept.insert(at, places[i])
+    return np.array(kept)
+
+
+def events(values, rate):
+    """The places at which the values are farthest from their median within each of the repeated
+    bursts of steep slope, such as the beats of an electrocardiogram; none where there are no three
+    of them."""
+    length = max(STEPS, round(EVENT_SECONDS * rate)) if rate else EVENT_SAMPLES
+    step = length // STEPS
+    if len(values) < 20 * step * STEPS:
+        return np.zeros(0)
+    strength = activity(values, step)
+    largest = np.sort(strength)[-(len(strength) // 10):]
+    bursts = peaks(strength, call("Median_head", largest) / 2, 9)
+    centres = separated(bursts.places, bursts.values, REFRACTORY * STEPS) * step + (step - 1) / 2
+    found = []
+    for centre in centres:
+        first = max(0, round(centre) - length)
+        part = values[first:round(centre) + length + 1]
+        away = np.abs(part - call("Median_head", part))
+        found.append(first + int(np.argmax(away)))
+    found = np.unique(np.array(found, float))
+    return found if len(found) >= 3 else np.zeros(0)
+
+
+# Pulses
+
+@dataclasses.dataclass
+class Pulse:
+    """One pulse; places and times in samples, aberrations in percent of the amplitude."""
+    rises: bool  # begins with a rising edge
+    low: float  # the levels of the states
+    high: float
+    start: float  # of the first transition
+    end: float  # of the second one
+    first_duration: float
+    second_duration: float
+    middle: float
+    width: float  # between the crossings of the mid reference
+    slew_rate: float  # of the first transition, per sample
+    first_overshoot: float  # beyond the state that the first transition leads to
+    second_overshoot: float
+
+
+HISTOGRAM = {"method": AUTOMATIC, "bins": BINS}
+
+
+def transition(values, direction, number):
+    """slewRate, duration, start, end and the overshoot in its direction."""
+    found = call("TransMeas", values, 0.0, 1.0, direction, number, REFERENCES, HISTOGRAM, 0)[1:]
+    under, over = found[-2:]
+    return *found[:4], over if direction == RISING else under
+
+
+def pulse(values, number=1, direction=RISING):
+    """Pulse `number` that begins with an edge of this direction, or None where there is none."""
+    try:
+        high, low, _ = call("StateLevels", values, 0.0, 1.0, AUTOMATIC, BINS, 0)
+        width, middle = (call("PulseMeasEx", values, 0.0, 1.0, direction, 1, number, REFERENCES,
+                              HISTOGRAM, 0)[i] for i in (1, 3))
+        first = transition(values, direction, number)
+        second = transition(values, 1 - direction, number)
+        if second[2] < first[3]:  # the waveform begins with an edge of the other direction
+            second = transition(values, 1 - direction, number + 1)
+    except QxError as error:
+        if error.name.startswith("ErrMeasure"):
+            return None
+        raise
+    return Pulse(direction == RISING, low, high, first[2], second[3], first[1], second[1], middle, width, first[0],
+                 first[4], second[4])
+
+
+MOST_PULSES = 1000
+
+
+def pulses(values, direction=RISING):
+    """All pulses of this direction, up to MOST_PULSES."""
+    found = []
+    while len(found) < MOST_PULSES and (one := pulse(values, len(found) + 1, direction)):
+        found.append(one)
+    return found
+
+
+def event_pulse(values, places, i):
+    """The pulse of event i, and the part of the values that it was measured in, as a slice: from half
+    way to the event before to half way to the next. None at the ends, and where it has no pulse."""
+    if not 0 < i < len(places) - 1:
+        return None
+    part = slice(int((places[i - 1] + places[i]) / 2), int((places[i] + places[i + 1]) / 2))
+    rises = values[int(places[i])] > call("Median_head", values[part])
+    found = pulse(values[part], 1, RISING if rises else FALLING)
+    return (found, part) if found else None
+
+
+def typical_event(values, places):
+    """The event_pulse of middling height among those that have one, else None."""
+    heights = np.abs(values[places.astype(int)] - call("Median_head", values))
+    order = np.argsort(np.abs(heights - call("Median_head", heights)), kind="stable")
+    return next(filter(None, (event_pulse(values, places, i) for i in order)), None)

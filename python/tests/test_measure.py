@@ -1,0 +1,139 @@
+"""Peaks, events and pulses: the module, the section of the report, the commands."""
+
+import csv
+import os
+import subprocess
+import sys
+import tempfile
+import unittest
+from pathlib import Path
+
+import numpy as np
+
+PYTHON = Path(__file__).resolve().parent.parent
+RECORDING = PYTHON.parent / "examples/data/ecg_208_360hz.csv"
+sys.path.insert(0, str(PYTHON))
+import qx  # noqa: E402
+from qx import measuring, recording, report, sections_measuring  # noqa: E402, F401
+
+
+def recorded(values, rate=None):
+    return recording.Recording("test", np.asarray(values, float), rate, "", "V", "voltage", [])
+
+
+def beats(rate, places, height=1.0):
+    """Bells of 12 ms on a slow wave."""
+    t = np.arange(round(30 * rate)) / rate
+    wave = 0.4 * np.sin(0.5 * t)
+    return wave + height * sum(np.exp(-((t - place) / 0.012)**2) for place in places)
+
+
+class Peaks(unittest.TestCase):
+    def test_a_stream_in_blocks(self):
+        """A record with pointers and an array by its address, from call to call."""
+        x = np.sin(0.1 * np.arange(1000))
+        state, buffer, places = {}, [], []
+        for i, block in enumerate(np.split(x, [100, 107, 600])):
+            request = {"data": block, "width": 7, "flags": 1 * (i == 0) + 4 * (i == 3)}
+            found, state, buffer = qx.PeakD(request, state, buffer)
+            self.assertEqual(buffer.size, 38 if i < 3 else 0)
+            places += list(found["locations"])
+        np.testing.assert_allclose(places, 10 * np.pi * (0.5 + 2 * np.arange(16)), atol=2e-3)
+        self.assertNotIn("fitMatrix", state)
+
+    def test_threshold_and_polarity(self):
+        x = np.tile([0, 0, 0, 0, 0, 0, 1, 3, 1, 0, 0, 0, 0, -2, 0], 20)
+        for valleys in (False, True):
+            found = measuring.peaks(x, width=3, valleys=valleys)
+            np.testing.assert_allclose(found.places, np.arange(20) * 15 + (13 if valleys else 7))
+
+
+class Events(unittest.TestCase):
+    def test_are_found_at_any_rate_and_polarity(self):
+        places = 0.5 + np.cumsum(np.random.default_rng(1).uniform(0.5, 1.2, 30))
+        places = places[places < 29.5]
+        for rate in (200.0, 360.0, 8000.0):
+            for height in (1.0, -1.0):
+                found = measuring.events(beats(rate, places, height), rate) / rate
+                np.testing.assert_allclose(found, places, atol=0.02)
+
+    def test_nothing_repeats(self):
+        for values in (np.zeros(5000), np.zeros(10), np.arange(3000.0), np.r_[np.zeros(2000), 1.0]):
+            self.assertEqual(len(measuring.events(values, None)), 0)
+            self.assertIsNone(sections_measuring.events(recorded(values)))
+
+    def test_of_two_near_ones_the_stronger_stays(self):
+        kept = measuring.separated(np.array([1.0, 2.0, 5.0, 6.5]), np.array([1.0, 3.0, 2.0, 1.0]), 1.5)
+        np.testing.assert_array_equal(kept, [2.0, 5.0, 6.5])
+
+    def test_section_of_the_recording(self):
+        section = sections_measuring.events(recording.read(RECORDING))
+        rows = {row.label: row.value for row in section.rows}
+        # 58 beats, counted in the plot; one burst of noise at 19.9 s stands in for its neighbour.
+        self.assertEqual(rows["Events"], "58")
+        self.assertAlmostEqual(float(rows["Rate, by the median interval"]), 116.8, delta=1)
+        self.assertTrue(0.01 < float(rows["Width at half height"]) < 0.05)
+        self.assertEqual(len(section.figures), 2)
+
+
+class Pulses(unittest.TestCase):
+    def test_trapezoids(self):
+        shape = np.r_[np.zeros(30), np.linspace(0, 1, 11), np.ones(40), np.linspace(1, 0, 6), np.zeros(13)]
+        x = np.tile(shape, 5) * 2 + 1
+        for direction, width in ((measuring.RISING, 48), (measuring.FALLING, 52)):
+            found = measuring.pulses(x, direction)
+            self.assertEqual(len(found), 5 if direction == measuring.RISING else 4)
+            for one in found:
+                self.assertAlmostEqual(one.width, width - 0.5, delta=1)
+                edges = [one.first_duration, one.second_duration]
+                np.testing.assert_allclose(sorted(edges), [4, 8], rtol=0.05)
+                self.assertLess(one.start, one.end)
+        self.assertEqual(measuring.pulses(np.zeros(100)), [])
+
+
+class Commands(unittest.TestCase):
+    def setUp(self):
+        folder = tempfile.TemporaryDirectory()
+        self.addCleanup(folder.cleanup)
+        self.table = os.path.join(folder.name, "out.csv")
+
+    def run_command(self, *arguments):
+        return subprocess.run([sys.executable, "-m", "qx", *map(str, arguments)], text=True,
+                              capture_output=True, env={**os.environ, "PYTHONPATH": str(PYTHON)})
+
+    def written(self):
+        with open(self.table, encoding="utf-8") as file:
+            head, *rows = csv.reader(file)
+        return head, np.array(rows, float)
+
+    def test_peaks(self):
+        ran = self.run_command("peaks", RECORDING, "--events", "--csv", self.table)
+        self.assertEqual(ran.stderr, "")
+        self.assertIn("58 events", ran.stdout)
+        head, rows = self.written()
+        self.assertEqual((head, rows.shape), (["time (s)", "mV"], (58, 2)))
+        ran = self.run_command("peaks", RECORDING, "--threshold", "1.2", "--width", "9", "--csv", self.table)
+        head, rows = self.written()
+        self.assertGreater(rows[:, 1].min(), 1.2)
+        self.assertGreater(len(rows), 20)
+        self.assertLess(rows[:, 2].max(), 0)
+
+    def test_pulse(self):
+        ran = self.run_command("pulse", RECORDING, "--events", "--number", "2", "--csv", self.table)
+        self.assertEqual(ran.stderr, "")
+        self.assertIn("pulse 2 of", ran.stdout)
+        head, rows = self.written()
+        self.assertTrue((np.diff(rows[:, 1]) > 0).all())
+        self.assertTrue((rows[:, 2] > rows[:, 1]).all())
+
+    def test_every_failure_is_one_line(self):
+        for arguments, reason in ((("pulse", RECORDING, "--number", 5000), "no pulse 5000"),
+                                  (("peaks", "nowhere.csv"), "no such file"),
+                                  (("peaks", RECORDING, "--width", 2), "below 3")):
+            ran = self.run_command(*arguments)
+            self.assertEqual(ran.returncode, 2)
+            self.assertIn(reason, ran.stderr.splitlines()[-1])
+
+
+if __name__ == "__main__":
+    unittest.main()
