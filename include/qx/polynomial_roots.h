@@ -23,11 +23,11 @@ QX_API ErrorCode PolyRootsNtBst_head(QX_IN DBL1D coef, QX_IN DBL1D realGuesses,
                                      double bairstowTolerance, QX_OUT CDB1D roots);
 
 /** All roots of a complex polynomial in place of its coefficients, in the order in which they are
-    found: Newton's method with a line search (K. Madsen, "A root-finding algorithm based on
-    Newton's method", 1973) and deflation. As many roots come out as the degree says; coefficients
-    of 0 at the top do not count. *maxIterations is how often a search may turn to another direction
-    before it takes a step. Multiple and clustered roots are found as well as the coefficients tell
-    them; CxMultPolyRoots_head is made for these. The code is in *err.
+    found: Newton's method with a line search, and deflation. As many roots come out as the degree
+    says; coefficients of 0 at the top do not count. *maxIterations is how often a search may turn
+    to another direction before it takes a step. Multiple and clustered roots are found as well as
+    the coefficients tell them; CxMultPolyRoots_head is made for these. A search can be stuck where
+    the polynomial is flat to the last bit, as x^43 - 1 is around 0. The code is in *err.
     Codes: ErrEmptyInput (coef is empty), ErrBadCoefficients (a coefficient is NaN, or the
     polynomial is constant), ErrOutOfMemory (no memory, or the host refuses the resize),
     ErrNonFiniteFunction (a search came to NaN), ErrIterationLimit (a search does not converge). */

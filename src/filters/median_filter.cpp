@@ -149,7 +149,7 @@ public:
     // A window passes through all ranks at each step, which only pays if it is short, and each
     // stretch begins with a sort.
     static bool pays(const Job &job) {
-        return job.width() <= 256 && job.n / (2 * medianStretches) >= job.width();
+        return job.width() <= 64 * lanesInUse && job.n / (2 * medianStretches) >= job.width();
     }
 
     ErrorCode run() {

@@ -9,10 +9,10 @@
 namespace qx {
 
 // All roots of a complex polynomial of n ascending coefficients, in the order in which they are
-// found: Newton's method with a line search and steps that turn where it leads nowhere, after K.
-// Madsen, "A root-finding algorithm based on Newton's method", 1973, and deflation. `roots` has n
-// places and may be `coef`; *rootCount is the degree, which counts no vanishing top coefficients.
-// A search may turn `maxIterations` times between two of its steps.
+// found: Newton's method with a line search and steps that turn where it leads nowhere, and
+// deflation. `roots` has n places and may be `coef`; *rootCount is the degree, which counts no
+// vanishing top coefficients. A search may turn `maxIterations` times between two of its steps. It
+// can be stuck where the polynomial is flat to the last bit.
 //
 // ErrEmptyInput; ErrBadCoefficients: NaN, or a constant; ErrNonFiniteFunction: NaN in a search;
 // ErrIterationLimit; ErrOutOfMemory.

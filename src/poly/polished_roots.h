@@ -20,11 +20,11 @@ void PolyDerivative(const DBL *coef, int32_t n, DBL *derivative);
 void NewtonRoot(const DBL *coef, int32_t n, double guess, int32_t maxIterations, double tolerance,
                 DBL *root, const DBL *derivative);
 
-// Improves guesses in pairs by Bairstow's method (L. Bairstow, Applied Aerodynamics, 1920), each
-// pair by itself on the whole polynomial: a quadratic factor x^2 - r x - s is changed until its
-// remainder settles. The roots of real pairs come first, then those of conjugate pairs. A guess
-// without a partner comes last and stays as it is, as all do with fewer than 4 coefficients.
-// `roots` does not overlap the guesses. ErrOutOfMemory.
+// Improves guesses in pairs by Bairstow's method, each pair by itself on the whole polynomial: a
+// quadratic factor x^2 - r x - s is changed until its remainder settles. The roots of real pairs
+// come first, then those of conjugate pairs. A guess without a partner comes last and stays as it
+// is, as all do with fewer than 4 coefficients. `roots` does not overlap the guesses.
+// ErrOutOfMemory.
 ErrorCode BairstowRoots(const DBL *coef, int32_t n, const CDB *guesses, int32_t guessCount,
                         int32_t maxIterations, double tolerance, CDB *roots, int32_t *rootCount);
 

@@ -77,8 +77,8 @@ private:
     int32_t degree_ = 0;
 };
 
-// The order in which factors keep the coefficients of their product accurate, after F. Leja: each
-// root is the one farthest from those before it, by the product of the distances. `distances` is
+// Leja's order, in which factors keep the coefficients of their product accurate: each root
+// is the one farthest from those before it, by the product of the distances. `distances` is
 // work memory.
 void OrderForProducts(const CDB *roots, int32_t count, I32 *order, DBL *distances) {
     for (int32_t j = 0; j < count; ++j) {

@@ -332,9 +332,7 @@ double LargestError(const Complexes &found, const std::vector<Multiple> &expecte
     return worst;
 }
 
-// The first four are published examples (Z. Zeng, 2005, with those of L. Brugnano and D. Trigiante,
-// 1995, and of M. Igarashi and T. Ypma, 1995, there), of which the first three are no less than
-// terrible for methods that know no multiplicity.
+// The first three leave no digit to methods that know no multiplicity.
 const std::vector<std::vector<Multiple>> structures = {
     {{1, 20}, {2, 15}, {3, 10}, {4, 5}},
     {{{1, -0.01}, 20}, {{1, 0.01}, 20}, {-2, 3}},
