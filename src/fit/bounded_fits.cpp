@@ -38,8 +38,8 @@ struct ModelFrame {
     FitModel model;
     ErrorCode (*start)(const FitSamples &samples, DBL *p);
     int32_t mostInFirstPass;
-    bool needsPositiveX;
-    int32_t divisor; // the parameter that must not start at 0, or -1
+    bool isOverLogarithm; // the model takes ln x, and x must be above 0
+    int32_t divisor;      // the parameter that must not start at 0, or -1
 };
 
 // The samples, or copies of them where they are fewer than the parameters: no sum is moved by that
@@ -66,6 +66,19 @@ public:
     }
     bool isPadded() const { return isPadded_; }
 
+    // ln x in place of x, which must be above 0.
+    ErrorCode takeLogarithms() {
+        for (int32_t i = 0; i < samples_.n; ++i)
+            if (samples_.x[i] <= 0.0)
+                return ErrNotStrictlyPositive;
+        if (const ErrorCode failed = logarithms_.allocate(samples_.n))
+            return failed;
+        for (int32_t i = 0; i < samples_.n; ++i)
+            logarithms_[i] = std::log(samples_.x[i]);
+        samples_.x = logarithms_.data();
+        return 0;
+    }
+
     // Without weights where all are 0.
     ErrorCode settleWeights(int32_t fewest) {
         if (samples_.w == nullptr)
@@ -84,7 +97,7 @@ public:
 private:
     FitSamples samples_ = {};
     bool isPadded_ = false;
-    Scratch<ElementType::DBL> memory_;
+    Scratch<ElementType::DBL> memory_, logarithms_;
 };
 
 // A bound, or 0 where there is none.
@@ -125,7 +138,7 @@ ErrorCode Iterate(const ModelFrame &frame, const BoundedFit &request, const FitS
     int32_t first = std::min(limit / 2, frame.mostInFirstPass);
     int32_t second = limit - first;
     // kept: a power law by least squares has all iterations without bounds, and one within them
-    const bool allInFirst = frame.needsPositiveX && request.method == leastSquares;
+    const bool allInFirst = frame.isOverLogarithm && request.method == leastSquares;
     if (allInFirst)
         first = limit;
     if (const ErrorCode failed = Pass(frame, samples, leastSquares, {nullptr, nullptr},
@@ -157,34 +170,47 @@ ErrorCode FitInFrame(const ModelFrame &frame, const BoundedFit &request) {
         return ErrInvalidSelector;
     if (const ErrorCode failed = samples.settleWeights(count))
         return failed;
-    for (int32_t i = 0; frame.needsPositiveX && i < n; ++i)
-        if (request.samples.x[i] <= 0.0)
-            return ErrNotStrictlyPositive;
+    if (frame.isOverLogarithm)
+        if (const ErrorCode failed = samples.takeLogarithms())
+            return failed;
     if (const ErrorCode failed = Start(frame, request, samples))
         return failed;
     if (const ErrorCode failed = Iterate(frame, request, samples.samples(), tolerance))
         return failed;
-    for (int32_t i = 0; i < n; ++i)
-        request.fit[i] =
-            frame.model.value(request.samples.x[i], request.p, count, frame.model.user);
     return 0;
+}
+
+template <class Model>
+void Evaluate(const BoundedFit &request) {
+    for (int32_t i = 0; i < request.samples.n; ++i)
+        request.fit[i] = Model::value(request.samples.x[i], request.p, nullptr);
 }
 
 } // namespace
 
 ErrorCode FitBoundedExponential(const BoundedFit &request) {
-    return FitInFrame({FitModelOf<ExponentialModel>(), StartExponential, 20, false, -1}, request);
+    const ErrorCode status =
+        FitInFrame({FitModelOf<ExponentialModel>(), StartExponential, 20, false, -1}, request);
+    if (status == 0)
+        Evaluate<ExponentialModel>(request);
+    return status;
 }
 
+// A power of x is an exponential of ln x.
 ErrorCode FitBoundedPower(const BoundedFit &request) {
-    return FitInFrame({FitModelOf<PowerModel>(), StartPower, 30, true, -1}, request);
+    const ErrorCode status =
+        FitInFrame({FitModelOf<ExponentialModel>(), StartExponential, 30, true, -1}, request);
+    if (status == 0)
+        Evaluate<PowerModel>(request);
+    return status;
 }
 
 ErrorCode FitBoundedGaussian(const BoundedFit &request) {
     const ErrorCode status =
         FitInFrame({FitModelOf<GaussianModel>(), StartGaussian, 20, false, 2}, request);
-    if (status >= 0)
-        request.p[2] = std::fabs(request.p[2]);
+    request.p[2] = std::fabs(request.p[2]);
+    if (status == 0)
+        Evaluate<GaussianModel>(request);
     return status;
 }
 

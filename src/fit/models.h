@@ -26,18 +26,10 @@ struct ExponentialModel {
     }
 };
 
-// a x^b + c for x > 0
+// a x^b + c for x > 0. It is fitted as an exponential of ln x, which has to be taken but once.
 struct PowerModel {
-    static constexpr int32_t count = 3;
     static double value(double x, const DBL *p, const void *) {
         return p[0] * std::pow(x, p[1]) + p[2];
-    }
-    static double evaluate(double x, const DBL *p, const void *, double *d) {
-        const double power = std::pow(x, p[1]);
-        d[0] = power;
-        d[1] = p[0] * power * std::log(x);
-        d[2] = 1.0;
-        return p[0] * power + p[2];
     }
 };
 

@@ -157,15 +157,6 @@ ErrorCode StartExponential(const FitSamples &samples, DBL *p) {
     return status < 0 ? status : 0;
 }
 
-ErrorCode StartPower(const FitSamples &samples, DBL *p) {
-    Work logarithms;
-    if (const ErrorCode failed = logarithms.allocate(samples.n))
-        return failed;
-    for (int32_t i = 0; i < samples.n; ++i)
-        logarithms[i] = std::log(samples.x[i]);
-    return StartExponential({logarithms.data(), samples.y, samples.w, samples.n}, p);
-}
-
 ErrorCode StartGaussian(const FitSamples &samples, DBL *p) {
     Counting counting;
     if (const ErrorCode failed = counting.take(samples))

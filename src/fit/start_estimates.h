@@ -9,11 +9,8 @@ namespace qx {
 // the model of that name (fit/models.h). Codes are those of the fits that they call.
 
 // The vertex of the parabola through the data is the offset c, or 0 where the data do not bend; a
-// and b are the exponential through what is left.
+// and b are the exponential through what is left. Over ln x it is the start of a power law.
 ErrorCode StartExponential(const FitSamples &samples, DBL *p);
-
-// The same over ln x.
-ErrorCode StartPower(const FitSamples &samples, DBL *p);
 
 // A peak that stands on the lowest level at which the data stay, or a dip in the highest one,
 // whichever fits better. A level is a tenth of the range of y with more than a tenth of the

@@ -110,7 +110,6 @@ struct CoreModel {
 
 std::vector<CoreModel> CoreModels() {
     return {{"exponential", qx::FitModelOf<qx::ExponentialModel>(), {2.5, -0.7, 0.3}},
-            {"power", qx::FitModelOf<qx::PowerModel>(), {1.5, -1.2, 0.7}},
             {"gaussian", qx::FitModelOf<qx::GaussianModel>(), {3.0, 1.8, 0.9, -0.4}}};
 }
 
