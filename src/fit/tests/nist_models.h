@@ -189,6 +189,7 @@ struct NistProblem {
     }
     struct Result {
         double digits, squares;
+        int steps;
     };
     Result solve(int start) const {
         std::vector<DBL> p(set.starts[start].begin(), set.starts[start].end());
@@ -196,7 +197,7 @@ struct NistProblem {
         double lambda = 0.1, mse = 0;
         BoundedLM(model(), samples(), leastSquares, {nullptr, nullptr}, p.data(), &iterations,
                   1e-15, &lambda, nullptr, &mse);
-        return {digits({p.begin(), p.end()}), mse * static_cast<double>(target.size())};
+        return {digits({p.begin(), p.end()}), mse * static_cast<double>(target.size()), iterations};
     }
     // The digits to which all parameters agree with the certified ones, of the 11 that there are.
     double digits(const std::vector<double> &p) const {

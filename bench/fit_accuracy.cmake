@@ -1,0 +1,1 @@
+qx_bench(fit_accuracy SOURCES fit_accuracy.cpp)
