@@ -4,6 +4,7 @@
 #include "spectra/convolution.h"
 
 #include <algorithm>
+#include <cmath>
 
 namespace qx {
 
@@ -26,39 +27,83 @@ ErrorCode MultiplyOut(const DBL *a, const DBL *b, DBL *fourthA, DBL *fourthB) {
     return ConvolveReal(b, 3, b + 3, 3, ConvolveDirectly, fourthB);
 }
 
-// A polynomial of degree 4 as a multiple of two factors |r|^2 - 2 re(r) x + x^2, each with a root r
-// and its conjugate.
+// A polynomial of degree 4 as a multiple of two factors modulus2 - 2 re x + x^2, each with a pair
+// of its roots: re is their mean, modulus2 their product.
 struct Factors {
     double re[2], modulus2[2];
     bool exist = false; // not if the degree is lower, or a coefficient NaN
 
-    // Conjugate roots come next to each other.
     ErrorCode find(double c0, const DBL *rest);
 
 private:
-    void take(int which, const CDB &root) {
-        re[which] = root.re;
-        modulus2[which] = root.re * root.re + root.im * root.im;
-    }
+    ErrorCode findWithin(double tolerance, const CDB *polynomial);
+    void take(int which, const CDB &root, const CDB &next);
+    void takeFour(const CDB *roots);
+    double deviation(const CDB *polynomial) const;
 };
 
-ErrorCode Factors::find(double c0, const DBL *rest) {
-    const CDB polynomial[5] = {{c0, 0}, {rest[0], 0}, {rest[1], 0}, {rest[2], 0}, {rest[3], 0}};
+bool IsReal(const CDB &root) { return std::fabs(root.im) < 1e-8 * std::fabs(root.re); }
+
+// Conjugate roots come next to each other; real ones, wherever they come, make a pair, too.
+void Factors::take(int which, const CDB &root, const CDB &next) {
+    re[which] = IsReal(root) ? 0.5 * (root.re + next.re) : +root.re;
+    modulus2[which] = IsReal(root) ? root.re * next.re : root.re * root.re + root.im * root.im;
+}
+
+void Factors::takeFour(const CDB *roots) {
+    CDB ordered[4];
+    int32_t n = 0;
+    for (const bool real : {true, false})
+        for (int32_t i = 0; i < 4; ++i)
+            if (IsReal(roots[i]) == real)
+                ordered[n++] = roots[i];
+    take(0, ordered[0], ordered[1]);
+    take(1, ordered[2], ordered[3]);
+}
+
+// Of the product of the factors from the polynomial, beside the greatest coefficient.
+double Factors::deviation(const CDB *polynomial) const {
+    const double product[5] = {
+        modulus2[0] * modulus2[1], -2.0 * (modulus2[0] * re[1] + re[0] * modulus2[1]),
+        modulus2[0] + modulus2[1] + 4.0 * re[0] * re[1], -2.0 * (re[0] + re[1]), 1.0};
+    double greatest = 0.0, most = 0.0;
+    for (int k = 0; k < 5; ++k) {
+        most = std::max(most, std::fabs(product[k] * polynomial[4].re - polynomial[k].re));
+        greatest = std::max(greatest, std::fabs(polynomial[k].re));
+    }
+    return most / greatest;
+}
+
+ErrorCode Factors::findWithin(double tolerance, const CDB *polynomial) {
     CDB refined[5], roots[5];
     I32 multiplicity[5];
     int32_t refinedCount = 0, count = 0;
-    const ErrorCode status = MultipleRootsComplex(polynomial, 5, 0, -1.0, refined, &refinedCount,
-                                                  roots, multiplicity, &count);
+    const ErrorCode status = MultipleRootsComplex(polynomial, 5, 0, tolerance, refined,
+                                                  &refinedCount, roots, multiplicity, &count);
     if (status == ErrOutOfMemory)
         return status;
     int32_t degree = 0;
     for (int32_t i = 0; status >= 0 && i < count; ++i)
         degree += multiplicity[i];
     exist = degree >= 4;
-    if (exist) {
-        take(0, roots[0]);
-        take(1, roots[std::min(count - 1, 2)]);
+    if (exist && count == 4) {
+        takeFour(roots);
+    } else if (exist) {
+        take(0, roots[0], roots[0]);
+        take(1, roots[count - 1], roots[count - 1]);
     }
+    return 0;
+}
+
+// In bands far below the sampling rate roots that are not the same lie so close together that they
+// are taken for one; then the product of the factors is another polynomial, and roots are told
+// apart as far as they can be.
+ErrorCode Factors::find(double c0, const DBL *rest) {
+    const CDB polynomial[5] = {{c0, 0}, {rest[0], 0}, {rest[1], 0}, {rest[2], 0}, {rest[3], 0}};
+    if (const ErrorCode failed = findWithin(-1.0, polynomial))
+        return failed;
+    if (exist && deviation(polynomial) > 1e-12)
+        return findWithin(1e-300, polynomial);
     return 0;
 }
 

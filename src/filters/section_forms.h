@@ -19,10 +19,10 @@ struct CascadeOutput {
 // the upper places.
 ErrorCode SecondToFourthOrder(const CascadeCoefficients &second, const CascadeOutput &fourth);
 
-// Each section is split between its conjugate pairs of roots; one of lower order stays whole, and
-// the section beside it is 1. The numerator is one whose first and last values are equal, as that
-// of a band filter is. Accuracy ends where the roots are a multiple one but for 1e-10: in bands
-// far below the sampling rate.
+// Each section is split between its conjugate pairs of roots, so that the product of the two is the
+// section within 1e-12 of its greatest coefficient; one of lower order stays whole, and the section
+// beside it is 1. The numerator is one whose first and last values are equal, as that of a band
+// filter is.
 ErrorCode FourthToSecondOrder(const CascadeCoefficients &fourth, const CascadeOutput &second);
 
 } // namespace qx

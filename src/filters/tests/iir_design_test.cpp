@@ -249,24 +249,39 @@ TEST(IIRDesign, LaysOutItsSections) {
         }
 }
 
-// Zeros on the unit circle have one modulus, so that their order says nothing of which are
-// conjugate.
-TEST(IIRDesign, SplitsSectionsBetweenConjugatePairs) {
+// 1 + c z^-1 + d z^-2.
+struct Quadratic {
+    double c, d;
+};
+
+void ExpectSplit(const Quadratic &p, const Quadratic &q) {
+    const double a[4] = {p.c + q.c, p.d + q.d + p.c * q.c, p.c * q.d + q.c * p.d, p.d * q.d};
+    const double b[5] = {2, 2 * (p.c + q.c), 2 * (2 + p.c * q.c), 2 * (p.c + q.c), 2};
+    double A[4], B[6];
+    ASSERT_EQ(qx::FourthToSecondOrder({a, 4, b, 5, 1}, {A, 4, B, 6}), 0);
+    const double productA[4] = {A[0] + A[2], A[1] + A[3] + A[0] * A[2], A[0] * A[3] + A[1] * A[2],
+                                A[1] * A[3]};
+    const double productB[5] = {B[0] * B[3], B[0] * B[4] + B[1] * B[3],
+                                B[0] * B[5] + B[1] * B[4] + B[2] * B[3], B[1] * B[5] + B[2] * B[4],
+                                B[2] * B[5]};
+    for (int k = 0; k < 4; ++k)
+        EXPECT_NEAR(productA[k], a[k], 1e-11) << p.c << " " << p.d << " " << q.c << " " << q.d;
+    for (int k = 0; k < 5; ++k)
+        EXPECT_NEAR(productB[k], b[k], 1e-11) << p.c << " " << q.c;
+}
+
+TEST(IIRDesign, SplitsSectionsIntoFactors) {
     for (double first = 0.1; first < 3; first += 0.17)
-        for (double second = 0.15; second < 3; second += 0.23) {
-            const double c[2] = {-2 * std::cos(first), -2 * std::cos(second)};
-            const double b[5] = {0.5, 0.5 * (c[0] + c[1]), 0.5 * (2 + c[0] * c[1]),
-                                 0.5 * (c[0] + c[1]), 0.5};
-            const double a[4] = {0.5 * (c[0] + c[1]), 0.25 * (2 + c[0] * c[1]),
-                                 0.125 * (c[0] + c[1]), 0.0625};
-            double splitA[4], splitB[6];
-            ASSERT_EQ(qx::FourthToSecondOrder({a, 4, b, 5, 1}, {splitA, 4, splitB, 6}), 0);
-            EXPECT_NEAR(splitB[1] * splitB[3] + splitB[0] * splitB[4], b[1], 1e-6);
-            EXPECT_NEAR(splitB[1] * splitB[4] + splitB[0] * splitB[5] + splitB[2] * splitB[3], b[2],
-                        1e-6);
-            EXPECT_NEAR(splitA[0] + splitA[2], a[0], 1e-6) << first << " " << second;
-            EXPECT_NEAR(splitA[1] * splitA[3], a[3], 1e-6);
-        }
+        for (double second = 0.15; second < 3; second += 0.23)
+            ExpectSplit({-std::cos(first), 0.25}, {-2 * 0.9 * std::cos(second), 0.81});
+    // Double roots; real roots, alone and beside a pair; roots that are nearly one.
+    ExpectSplit({-1.2, 0.5}, {-1.2, 0.5});
+    ExpectSplit({-1.2, 0.35}, {-1.5, 0.54});
+    ExpectSplit({-1.2, 0.35}, {0.2, 0.54});
+    ExpectSplit({0.2, 0.54}, {-1.2, 0.35});
+    for (const double near : {1e-2, 1e-3, 1e-4, 1e-5})
+        ExpectSplit({-2 * (1 - near) * std::cos(near), (1 - near) * (1 - near)},
+                    {-2 * (1 - near) * std::cos(2 * near), (1 - near) * (1 - near)});
     const double a[4] = {}, b[5] = {};
     double out[6];
     EXPECT_EQ(qx::FourthToSecondOrder({a, 4, b, 4, 1}, {out, 4, out, 6}), ErrCoefficientSizes);
