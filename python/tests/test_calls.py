@@ -69,12 +69,15 @@ class Arrays(unittest.TestCase):
         kind = arrays.kind("DBL", 1)
         _, whole = qx.histgran_head(np.arange(100.0), 20_000)
         self.assertIs(kind.given(whole, "x"), whole.base)
-        for other in (whole[1:], whole[::-1], whole.copy(), whole.astype(np.float32)):
+        for other in (whole[1:], whole[:-1], whole[::-1], whole.copy(), whole.astype(np.float32)):
             self.assertIsNot(kind.given(other, "x"), whole.base)
         self.assertIsNot(kind.given(whole, "x", reuse=False), whole.base)
         # A square turned about its diagonal has the shape and the address of its block, too.
         square = qx.DCT_2DH(np.arange(10_000.0).reshape(100, 100), 0, 0)
         self.assertIsNot(arrays.kind("DBL", 2).given(square.T, "x"), square.base)
+        square.shape = (50, 200)  # in place: no longer what the block says
+        self.assertIsNot(arrays.kind("DBL", 2).given(square, "x"), square.base)
+        square.shape = (100, 100)
         np.testing.assert_allclose(qx.InvDCT_2DH(square.T), np.arange(10_000.0).reshape(100, 100).T,
                                    atol=1e-9)
 
@@ -89,6 +92,10 @@ class Arrays(unittest.TestCase):
             with self.assertRaises(qx.QxError) as caught:
                 qx.ReOXFFTH80(x, 0, n, 0)
             self.assertEqual(caught.exception.results["out"].size, 0)
+        self.assertEqual(qx.CxConvolution([1j, 2], [3], 0, 0, 0).tolist(), [3j, 6])
+        with self.assertRaises(qx.QxError) as caught:
+            qx.CxConvolution([], [3], 0, 0, 0)  # which leaves its output alone
+        self.assertEqual(caught.exception.results["out"].size, 0)
         kept = arrays.kind("DBL", 1).kept
         for n in range(1, 3 * arrays.KEPT_SHAPES):
             qx.Mean_head(np.ones(n))
