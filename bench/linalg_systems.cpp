@@ -1,7 +1,8 @@
 // Products, LU solves and inverses against BLAS and LAPACK, both as the module carries them, so
 // that the same kernels stand behind either side. And what an export adds to its inner routine.
 //
-// bench_linalg_systems [GROUP...]: products, ordered, small, solve, inverse, frame; all by default.
+// bench_linalg_systems [GROUP...]: products, ordered, small, solve, complex, inverse,
+// frame; all by default.
 
 #include "bench/timing.h"
 #include "linalg/blas_memory.h"
@@ -93,23 +94,42 @@ void Ordered() {
     ratios.summary("cblas_dgemm");
 }
 
-void Solve(const char *name, std::initializer_list<int32_t> sizes) {
+void SolveByLapack(int32_t n, double *a, int32_t *pivots, double *x) {
+    const int32_t one = 1;
+    int32_t info;
+    LAPACK_dgesv(&n, &one, a, &n, pivots, x, &n, &info);
+}
+void SolveByLapack(int32_t n, CDB *a, int32_t *pivots, CDB *x) {
+    const int32_t one = 1;
+    int32_t info;
+    LAPACK_zgesv(&n, &one, a, &n, pivots, x, &n, &info);
+}
+
+template <class T>
+std::vector<T> RandomOf(std::size_t count) {
+    const std::vector<double> numbers = Random(count * (sizeof(T) / sizeof(double)));
+    std::vector<T> x(count);
+    std::memcpy(x.data(), numbers.data(), count * sizeof(T));
+    return x;
+}
+
+template <class T>
+void Solve(const char *name, const char *peer, std::initializer_list<int32_t> sizes) {
     Ratios ratios(name);
     for (const int32_t n : sizes) {
-        const auto a = Random(static_cast<std::size_t>(n) * n), b = Random(n);
-        std::vector<double> factors(a.size()), x(n), y(n);
+        const auto a = RandomOf<T>(static_cast<std::size_t>(n) * n), b = RandomOf<T>(n);
+        std::vector<T> factors(a.size()), x(n), y(n);
         std::vector<int32_t> pivots(n);
         Compare(
-            ratios, "solve", n, [&] { qx::SolveByLU(a.data(), n, b.data(), x.data()); },
+            ratios, sizeof(T) == sizeof(double) ? "solve" : "complex solve", n,
+            [&] { qx::SolveByLU(a.data(), n, b.data(), x.data()); },
             [&] {
-                const int32_t one = 1;
-                int32_t info;
                 factors = a;
                 y = b;
-                LAPACK_dgesv(&n, &one, factors.data(), &n, pivots.data(), y.data(), &n, &info);
+                SolveByLapack(n, factors.data(), pivots.data(), y.data());
             });
     }
-    ratios.summary("LAPACK dgesv");
+    ratios.summary(peer);
 }
 
 void Inverse() {
@@ -162,9 +182,13 @@ int main(int argc, char **argv) {
     if (wanted("ordered"))
         Ordered();
     if (wanted("small"))
-        Solve("linear systems up to 8 by 8", {1, 2, 3, 4, 5, 6, 7, 8});
+        Solve<double>("linear systems up to 8 by 8", "LAPACK dgesv", {1, 2, 3, 4, 5, 6, 7, 8});
     if (wanted("solve"))
-        Solve("linear systems of 16 to 2000", {16, 32, 64, 100, 200, 300, 500, 1000, 2000});
+        Solve<double>("linear systems of 16 to 2000", "LAPACK dgesv",
+                      {16, 32, 64, 100, 200, 300, 500, 1000, 2000});
+    if (wanted("complex"))
+        Solve<CDB>("complex linear systems of 1 to 1000", "LAPACK zgesv",
+                   {1, 2, 4, 8, 16, 32, 64, 100, 200, 500, 1000});
     if (wanted("inverse"))
         Inverse();
     if (wanted("frame"))

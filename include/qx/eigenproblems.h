@@ -16,7 +16,9 @@ QX_BEGIN_DECLS
     positive imaginary part first; otherwise the order is that of the iteration. Balancing, reduction
     to Hessenberg form and QR iteration: J. H. Wilkinson and C. Reinsch, "Handbook for Automatic
     Computation", volume II, 1971. The values are those of a matrix that differs from the balanced a by
-    a few n eps of its norm.
+    a few n eps of its norm. Matrices that are graded over the whole range of the numbers can pass the
+    limit of the iteration: random elements that halve from row to row and from column to column do
+    from order 110 on.
     Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrOutOfMemory (no memory),
     ErrInvalidSelector (*output is not 0 or 1), ErrNonFiniteInput (an element is not finite),
     ErrIterationLimit (40 iterations were not enough for a value). */

@@ -49,7 +49,7 @@ private:
 };
 
 // The double-shift QR iteration on a real Hessenberg matrix (J. G. F. Francis, "The QR
-// transformation", 1961). With Schur vectors the whole matrix becomes quasi-triangular, without
+// transformation, part 2", 1962). With Schur vectors the whole matrix becomes quasi-triangular, without
 // them only the part that the eigenvalues need is kept up.
 class RealQR {
 public:
