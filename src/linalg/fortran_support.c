@@ -31,9 +31,11 @@ double _Complex csqrt(double _Complex z) {
     return root;
 }
 
-/* Halves away from zero. */
-long lround(double x) { return (long)(x < 0.0 ? ceil(x - 0.5) : floor(x + 0.5)); }
-long lroundf(float x) { return lround((double)x); }
+/* Halves away from zero. lroundf may not call lround: the compiler knows that lround of a float is
+   lroundf, and would make it call itself for ever. */
+static long Nearest(double x) { return (long)(x < 0.0 ? ceil(x - 0.5) : floor(x + 0.5)); }
+long lround(double x) { return Nearest(x); }
+long lroundf(float x) { return Nearest((double)x); }
 float logf(float x) { return (float)log((double)x); }
 
 /* BLAS and LAPACK report a bad argument here, which none of our calls has. The process is the

@@ -124,7 +124,7 @@ Complex TimesExp(Complex factor, Complex exponent) {
 
 ComplexModifiedPair ModifiedBesselOnDiagonal(double order, double x) {
     // z = x exp(i pi / 4): s^2 = order^2 + i x^2
-    const Complex s = SquareRoot(Complex{order * order, x * x});
+    const Complex s = RootOfRightHalf(Complex{order * order, x * x});
     const Complex z = {x * kRootHalf, x * kRootHalf};
     const Complex logarithm = Log((s + order) / z); // asinh(order / z)
     const Complex exponent = s - logarithm * order;
@@ -142,7 +142,7 @@ ComplexModifiedPair ModifiedBesselOnDiagonal(double order, double x) {
         sumK = k % 2 == 0 ? sumK + term : sumK - term;
         power = power * t * (1 / order);
     }
-    const Complex scale = Complex{1, 0} / SquareRoot(s * kTwoPi);
+    const Complex scale = Complex{1, 0} / RootOfRightHalf(s * kTwoPi);
     const Complex i = TimesExp(scale * sumI, exponent);
     const Complex k = TimesExp(scale * sumK * (0.5 * kTwoPi), Complex{0, 0} - exponent);
     return {i.re, i.im, k.re, k.im};

@@ -90,7 +90,7 @@ OrdersZeroOne ContinuedK(Complex z, double x) {
             break;
     }
     OrdersZeroOne k = {};
-    k.k0 = SquareRoot(Complex{0.5 * kPi, 0} / z) * ExpOnDiagonal(x, -1) / s;
+    k.k0 = RootOfRightHalf(Complex{0.5 * kPi, 0} / z) * ExpOnDiagonal(x, -1) / s;
     k.k1 = k.k0 * (z + 0.5 - h * 0.25) / z;
     return k;
 }
@@ -158,7 +158,7 @@ Complex AsymptoticI(double n, Complex z, double x) {
         if (Size(term) <= 0.25 * kEpsilon)
             break;
     }
-    return ExpOnDiagonal(x, 1) * (sum / SquareRoot(z * (2 * kPi)));
+    return ExpOnDiagonal(x, 1) * (sum / RootOfRightHalf(z * (2 * kPi)));
 }
 
 // The ratio I_(n+1) / I_n by downward recurrence from far above, then the Wronskian.

@@ -1,5 +1,6 @@
 #include "transforms/chirp_z.h"
 
+#include "frame/complex.h"
 #include "frame/scratch.h"
 #include "spectra/convolution.h"
 
@@ -14,23 +15,7 @@ namespace {
 
 typedef Scratch<ElementType::CDB> Work;
 
-CDB Product(const CDB &a, const CDB &b) {
-    return {a.re * b.re - a.im * b.im, a.im * b.re + a.re * b.im};
-}
-CDB Product(double a, const CDB &b) { return {a * b.re, a * b.im}; }
-CDB Sum(const CDB &a, const CDB &b) { return {a.re + b.re, a.im + b.im}; }
-
-// Divides by the larger part first, so that no square overflows.
-CDB Quotient(const CDB &a, const CDB &b) {
-    if (std::fabs(b.re) >= std::fabs(b.im)) {
-        const double ratio = b.im / b.re;
-        const double divisor = b.re + b.im * ratio;
-        return {(a.re + a.im * ratio) / divisor, (a.im - a.re * ratio) / divisor};
-    }
-    const double ratio = b.re / b.im;
-    const double divisor = b.re * ratio + b.im;
-    return {(a.re * ratio + a.im) / divisor, (a.im * ratio - a.re) / divisor};
-}
+constexpr CDB one = {1.0, 0.0};
 
 double Square(const CDB &z) { return z.re * z.re + z.im * z.im; }
 
@@ -77,8 +62,8 @@ template <ElementType Code>
 void TakeStart(const typename Element<Code>::type *x, std::ptrdiff_t n, const CDB &a, CDB *terms) {
     CDB factor = Powers(a).of(static_cast<double>(1 - n));
     for (std::ptrdiff_t k = n - 1; k >= 0; --k) {
-        terms[k] = Product(x[k], factor);
-        factor = Product(factor, a);
+        terms[k] = factor * x[k];
+        factor = factor * a;
     }
 }
 
@@ -89,7 +74,7 @@ void SumDirectly(const CDB *terms, std::ptrdiff_t n, const CDB &w, CDB *out, std
         CDB sum = {0.0, 0.0};
         double exponent = 0;
         for (std::ptrdiff_t k = 0; k < n; ++k) {
-            sum = Sum(sum, Product(terms[k], powers.of(exponent)));
+            sum += terms[k] * powers.of(exponent);
             exponent += static_cast<double>(m);
         }
         out[m] = sum;
@@ -113,13 +98,13 @@ ErrorCode SumByConvolution(CDB *terms, int32_t n, const CDB &w, CDB *out, int32_
         chirp[t] = powers.of(-(i * i) * 0.5);
     }
     for (std::ptrdiff_t k = 0; k < n; ++k)
-        terms[k] = Quotient(terms[k], chirp[n - k]);
+        terms[k] = terms[k] / chirp[n - k];
     if (const ErrorCode failed =
             ConvolveComplex(&terms->re, n, &chirp->re, static_cast<int32_t>(chirpLength),
                             &convolution->re, ConvolveByTransform))
         return failed;
     for (std::ptrdiff_t m = 0; m < count; ++m)
-        out[m] = Quotient(convolution[n + m], chirp[n + m]);
+        out[m] = convolution[n + m] / chirp[n + m];
     return memory.release();
 }
 
@@ -145,7 +130,7 @@ struct Scaled {
     int32_t exponent = 0;
 
     Scaled times(const CDB &factor) const {
-        const CDB product = Product(value, factor);
+        const CDB product = value * factor;
         int shift = 0;
         std::frexp(std::max(std::fabs(product.re), std::fabs(product.im)), &shift);
         return {{std::ldexp(product.re, -shift), std::ldexp(product.im, -shift)}, exponent + shift};
@@ -171,7 +156,7 @@ public:
                     std::numeric_limits<double>::epsilon() * w.way(static_cast<double>(k));
                 if (std::hypot(difference.re, difference.im) <= rounding)
                     return ErrDegenerateValue;
-                u = u.times(Quotient({1.0, 0.0}, difference));
+                u = u.times(one / difference);
             }
             values_[k] = u.value;
             exponents_[k] = u.exponent;
@@ -215,7 +200,7 @@ std::ptrdiff_t BestStretch(std::ptrdiff_t n, std::ptrdiff_t count, const CDB &w,
     }
     const std::ptrdiff_t first = std::clamp<std::ptrdiff_t>(index - count / 2, 0, n - count);
     for (std::ptrdiff_t k = 0; k < first; ++k)
-        *start = Product(*start, w);
+        *start = *start * w;
     return first;
 }
 
@@ -230,15 +215,14 @@ ErrorCode Interpolate(const CDB *values, int32_t n, const CDB &w, CDB *work, CDB
     CDB *const sums = weighted + n;
     CDB *const binomials = sums + n;
     for (std::ptrdiff_t m = 0; m < n; ++m)
-        weighted[m] = Product(
-            values[m], Product(AlternatingChirp(powers, m, 1), u.pair(m, n - 1 - m).plain(0)));
-    SumDirectly(weighted, n, Quotient({1.0, 0.0}, w), sums, n);
+        weighted[m] = values[m] * (AlternatingChirp(powers, m, 1) * u.pair(m, n - 1 - m).plain(0));
+    SumDirectly(weighted, n, one / w, sums, n);
     const CDB last = powers.oneLess(static_cast<double>(-n));
     const Scaled whole = u[n - 1];
     binomials[0] = {1.0, 0.0};
     for (std::ptrdiff_t k = 1; k < n; ++k) {
-        const Scaled quotient = u.pair(k, n - k).times(Quotient(last, whole.value));
-        binomials[k] = Product(AlternatingChirp(powers, k, -1), quotient.plain(-whole.exponent));
+        const Scaled quotient = u.pair(k, n - k).times(last / whole.value);
+        binomials[k] = AlternatingChirp(powers, k, -1) * quotient.plain(-whole.exponent);
     }
     return ConvolveComplex(&sums->re, n, &binomials->re, n, &y->re, ConvolveDirectly);
 }
@@ -258,7 +242,7 @@ ErrorCode InverseChirpZ(const CDB *in, int32_t n, CDB a, CDB w, CDB *out, int32_
     Work memory;
     if (const ErrorCode failed = memory.allocate(5 * int64_t{count}))
         return failed;
-    CDB start = Quotient({1.0, 0.0}, a);
+    CDB start = one / a;
     const std::ptrdiff_t first = count < n ? BestStretch(n, count, w, &start) : 0;
     if (Square(start) == 0.0)
         return ErrDegenerateValue;
@@ -268,7 +252,7 @@ ErrorCode InverseChirpZ(const CDB *in, int32_t n, CDB a, CDB w, CDB *out, int32_
         return failed;
     const Powers powers(start);
     for (std::ptrdiff_t k = 0; k < count; ++k)
-        out[k] = Product(y[k], powers.of(static_cast<double>(-k)));
+        out[k] = y[k] * powers.of(static_cast<double>(-k));
     return memory.release();
 }
 

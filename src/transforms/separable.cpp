@@ -64,6 +64,29 @@ ErrorCode MatrixWindow::take(const DBL *in, int32_t inRows, int32_t inCols, int3
     return 0;
 }
 
+namespace {
+
+// `transform` makes one transform of n values: plan, from, to, n.
+template <class Transform>
+ErrorCode InBothDirections(const FFTPlan *columnPlan, const FFTPlan *rowPlan, const DBL *in,
+                           DBL *out, int32_t rows, int32_t cols, bool columnsFirst, DBL *columns,
+                           const Transform &transform) {
+    const auto along = [&](const FFTPlan *plan, int32_t n) {
+        return [=, &transform](const DBL *from, DBL *to) { return transform(plan, from, to, n); };
+    };
+    if (columnsFirst) {
+        if (const ErrorCode failed =
+                TransformColumns(in, out, rows, cols, columns, along(columnPlan, rows)))
+            return failed;
+        return TransformRows(out, out, rows, cols, along(rowPlan, cols));
+    }
+    if (const ErrorCode failed = TransformRows(in, out, rows, cols, along(rowPlan, cols)))
+        return failed;
+    return TransformColumns(out, out, rows, cols, columns, along(columnPlan, rows));
+}
+
+} // namespace
+
 template <class Transform>
 ErrorCode SeparableForward(const FFTPlan *columnPlan, const FFTPlan *rowPlan, const DBL *in,
                            DBL *out, int32_t rows, int32_t cols) {
@@ -71,15 +94,11 @@ ErrorCode SeparableForward(const FFTPlan *columnPlan, const FFTPlan *rowPlan, co
     if (const ErrorCode failed =
             work.take(Transform::forwardWork(rows), Transform::forwardWork(cols), rows))
         return failed;
-    DBL *const scratch = work.block.data();
-    const auto along = [scratch](const FFTPlan *plan, int32_t n) {
-        return [=](const DBL *from, DBL *to) {
-            return Transform::forward(plan, from, n, to, 1, 1, n, scratch);
-        };
-    };
-    if (const ErrorCode failed = TransformRows(in, out, rows, cols, along(rowPlan, cols)))
-        return failed;
-    return TransformColumns(out, out, rows, cols, work.columns, along(columnPlan, rows));
+    return InBothDirections(columnPlan, rowPlan, in, out, rows, cols, false, work.columns,
+                            [&](const FFTPlan *plan, const DBL *from, DBL *to, int32_t n) {
+                                return Transform::forward(plan, from, n, to, 1, 1, n,
+                                                          work.block.data());
+                            });
 }
 
 template <class Transform>
@@ -89,21 +108,11 @@ ErrorCode SeparableInverse(const FFTPlan *columnPlan, const FFTPlan *rowPlan, co
     if (const ErrorCode failed =
             work.take(Transform::inverseWork(rows), Transform::inverseWork(cols), rows))
         return failed;
-    DBL *const scratch = work.block.data();
-    const auto along = [scratch](const FFTPlan *plan, int32_t n) {
-        return [=](const DBL *from, DBL *to) {
-            return Transform::inverse(from, to, 1, 1, n, scratch, plan);
-        };
-    };
-    if (Transform::inverseRunsColumnsFirst) {
-        if (const ErrorCode failed =
-                TransformColumns(in, out, rows, cols, work.columns, along(columnPlan, rows)))
-            return failed;
-        return TransformRows(out, out, rows, cols, along(rowPlan, cols));
-    }
-    if (const ErrorCode failed = TransformRows(in, out, rows, cols, along(rowPlan, cols)))
-        return failed;
-    return TransformColumns(out, out, rows, cols, work.columns, along(columnPlan, rows));
+    return InBothDirections(
+        columnPlan, rowPlan, in, out, rows, cols, Transform::inverseRunsColumnsFirst, work.columns,
+        [&](const FFTPlan *plan, const DBL *from, DBL *to, int32_t n) {
+            return Transform::inverse(from, to, 1, 1, n, work.block.data(), plan);
+        });
 }
 
 template ErrorCode SeparableForward<CosineTransform>(const FFTPlan *, const FFTPlan *, const DBL *,

@@ -191,6 +191,9 @@ TEST(Schur, GivesTheMatrixBackWithItsEigenvaluesInOrder) {
             ExpectSchur(RealMatrix(MatrixKinds()[0], n, n), n, order, Schur80_head);
             ExpectSchur(ComplexMatrix(MatrixKinds()[0], n, n), n, order, CxSchur80_head);
         }
+    // From 150 on the number of LAPACK's shifts follows from logarithms.
+    ExpectSchur(RealMatrix(MatrixKinds()[0], 160, 160), 160, 0, Schur80_head);
+    ExpectSchur(ComplexMatrix(MatrixKinds()[0], 160, 160), 160, 0, CxSchur80_head);
 }
 
 } // namespace

@@ -4,7 +4,7 @@
 #include "linalg/systems/least_squares.h"
 #include "linalg/systems/lu.h"
 #include "linalg/tests/exact.h"
-#include "linalg/tests/filled.h"
+#include "linalg/tests/host_matrix.h"
 #include "linalg/tests/matrices.h"
 
 #include <gtest/gtest.h>
@@ -26,8 +26,8 @@ using qx::test::Noise;
 typedef qx::test::Array1D<ElementType::DBL> DBLVector;
 typedef qx::test::Array1D<ElementType::CDB> CDBVector;
 typedef qx::test::Array1D<ElementType::I32> I32Vector;
-typedef qx::test::FilledDBL DBLMatrix;
-typedef qx::test::FilledCDB CDBMatrix;
+typedef qx::test::DBL2DArray DBLMatrix;
+typedef qx::test::CDB2DArray CDBMatrix;
 
 constexpr double inf = std::numeric_limits<double>::infinity();
 const double nan = std::numeric_limits<double>::quiet_NaN();

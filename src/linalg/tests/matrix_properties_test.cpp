@@ -1,6 +1,6 @@
 #include "qx/matrix_properties.h"
 
-#include "linalg/tests/filled.h"
+#include "linalg/tests/host_matrix.h"
 #include "tests/support/recipe.h"
 
 #include <gtest/gtest.h>
@@ -11,8 +11,8 @@
 
 namespace {
 
-typedef qx::test::FilledDBL DBLMatrix;
-typedef qx::test::FilledCDB CDBMatrix;
+typedef qx::test::DBL2DArray DBLMatrix;
+typedef qx::test::CDB2DArray CDBMatrix;
 typedef qx::test::Array1D<qx::ElementType::DBL> DBLVector;
 typedef qx::test::Array1D<qx::ElementType::CDB> CDBVector;
 
