@@ -49,8 +49,8 @@ private:
 };
 
 // The double-shift QR iteration on a real Hessenberg matrix (J. G. F. Francis, "The QR
-// transformation, part 2", 1962). With Schur vectors the whole matrix becomes quasi-triangular, without
-// them only the part that the eigenvalues need is kept up.
+// transformation", The Computer Journal 4, 1962, pages 332 to 345). With Schur vectors the whole
+// matrix becomes quasi-triangular, without them only the part that the eigenvalues need is kept up.
 class RealQR {
 public:
     RealQR(DBL *h, std::ptrdiff_t stride, int32_t n, Balanced range, CDB *values)
