@@ -12,16 +12,17 @@
 QX_BEGIN_DECLS
 
 /** The line y = slope x + intercept; its values take the place of y. In closed form with plain
-   sums, so abscissae that are all equal give NaN or infinities and no failure, and abscissae far
-   from 0 cost digits. Weights that are all 0 count as none. Codes: ErrSizeMismatch (the arrays
-   differ in length), ErrFewerThanTwo (less than two samples), ErrNonFiniteInput (a weight is NaN),
-   ErrTooFewWeights (all weights but one are 0), ErrOutOfMemory (no memory where x or w is y). */
+    sums, so abscissae that are all equal give NaN or infinities and no failure, and abscissae far
+    from 0 cost digits. Weights that are all 0 count as none.
+    Codes: ErrSizeMismatch (the arrays differ in length), ErrFewerThanTwo (less than two samples),
+    ErrNonFiniteInput (a weight is NaN), ErrTooFewWeights (all weights but one are 0),
+    ErrOutOfMemory (no memory where x or w is y). */
 QX_API ErrorCode LinFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, QX_OUT double *slope,
                              QX_OUT double *intercept, QX_OUT double *mse);
 /** As LinFit_head, for the coefficients alone and without weights. The function result is 0 and the
     code stands in *err.
-    Codes: ErrSizeMismatch (the arrays differ in length), ErrFewerThanTwo (less than two samples).
- */
+    Codes: ErrSizeMismatch (the arrays differ in length), ErrFewerThanTwo (less than two
+    samples). */
 QX_API int32_t LinFitCoef_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_OUT double *slope,
                                QX_OUT double *intercept, QX_OUT ErrorCode *err);
 /** As LinFitCoef_head, with weights as in LinFit_head.
@@ -37,9 +38,9 @@ QX_API int32_t LinFitCoef80_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, QX
     Codes: ErrSizeMismatch (the arrays differ in length), ErrPolynomialOrderNegative (order is
     negative), ErrPolynomialOrderTooHigh (not more samples than `order`), ErrOutOfMemory (no memory,
     or the host refused a resize), ErrInvalidSelector (no such algorithm), ErrNonFiniteInput (a
-   power of x, or with algorithm 5 a y, is not finite), ErrSingularMatrix (algorithms 1 to 5 met a
-   singular system), ErrIterationLimit (the singular values do not converge),
-   WarnPolynomialOrderCapped (order is above 25). */
+    power of x, or with algorithm 5 a y, is not finite), ErrSingularMatrix (algorithms 1 to 5 met a
+    singular system), ErrIterationLimit (the singular values do not converge),
+    WarnPolynomialOrderCapped (order is above 25). */
 QX_API ErrorCode PolyFit_head(QX_IN DBL1D x, QX_IN DBL1D y, int32_t order, int32_t algorithm,
                               QX_OUT DBL1D fit, QX_OUT DBL1D coefficients, QX_OUT double *mse);
 /** As PolyFit_head, with coefficients that are given: that of order fixedOrders[i] is
@@ -51,8 +52,8 @@ QX_API ErrorCode PolyFit_head(QX_IN DBL1D x, QX_IN DBL1D y, int32_t order, int32
     `order` less the number of fixed orders, or less samples than free terms), ErrOutOfMemory (no
     memory, or the host refused a resize), ErrInvalidSelector (no such algorithm), ErrNonFiniteInput
     (a power of x, or with algorithm 5 a y, is not finite), ErrSingularMatrix (algorithms 1 to 5 met
-   a singular system), ErrIterationLimit (the singular values do not converge), ErrEmptyInput (no
-   sample, with all coefficients given), WarnPolynomialOrderCapped (order is above 25). */
+    a singular system), ErrIterationLimit (the singular values do not converge), ErrEmptyInput (no
+    sample, with all coefficients given), WarnPolynomialOrderCapped (order is above 25). */
 QX_API ErrorCode PolyFit80_head(QX_IN DBL1D x, QX_IN DBL1D y, int32_t order, int32_t algorithm,
                                 QX_IN I32_1D fixedOrders, QX_IN DBL1D fixedValues, QX_OUT DBL1D fit,
                                 QX_OUT DBL1D coefficients, QX_OUT double *mse);
@@ -62,9 +63,9 @@ QX_API ErrorCode PolyFit80_head(QX_IN DBL1D x, QX_IN DBL1D y, int32_t order, int
     `order` less the number of fixed orders, or less samples than free terms), ErrOutOfMemory (no
     memory, or the host refused a resize), ErrInvalidSelector (no such algorithm), ErrNonFiniteInput
     (a weight or a power of x, or with algorithm 5 a y, is not finite), ErrSingularMatrix
-   (algorithms 1 to 5 met a singular system), ErrIterationLimit (the singular values do not
-   converge), ErrEmptyInput (no sample, with all coefficients given), WarnPolynomialOrderCapped
-   (order is above 25). */
+    (algorithms 1 to 5 met a singular system), ErrIterationLimit (the singular values do not
+    converge), ErrEmptyInput (no sample, with all coefficients given), WarnPolynomialOrderCapped
+    (order is above 25). */
 QX_API ErrorCode PolyFit81_head(QX_IN DBL1D x, QX_IN DBL1D y, int32_t order, QX_IN DBL1D w,
                                 int32_t algorithm, QX_IN I32_1D fixedOrders,
                                 QX_IN DBL1D fixedValues, QX_OUT DBL1D fit,
@@ -73,15 +74,14 @@ QX_API ErrorCode PolyFit81_head(QX_IN DBL1D x, QX_IN DBL1D y, int32_t order, QX_
 /** The coefficients c that minimise the weighted squares of y - H c, for a matrix with one row per
     sample, and fit = H c. `algorithm`: 0 singular values; 1, 2, 3 Householder QR; 4 LU and 5
     Cholesky factorisation of the normal equations, which square the condition of H; 6 singular
-    values without those up to n times 2.2e-16 of the largest. Where columns depend on each
-    other, 6 gives the shortest of the solutions, and 0 one that rounding errors decide. Where
-   wantCovariance is not 0, `covariance` is the inverse of H^T |W| H (not scaled by the MSE), else 0
-   by 0. Codes: ErrSizeMismatch (H, y and weights differ in length), ErrOutOfMemory (no memory, or
-   the host refused a resize), ErrOrderNotPositive (H has no columns), ErrPolynomialOrderTooHigh
-   (less rows than columns), ErrInvalidSelector (no such algorithm), ErrNonFiniteInput (H or a
-   weight, or with algorithm 5 a y, is not finite, where the method tests it), ErrSingularMatrix
-   (algorithms 1 to 5 met a singular system), ErrIterationLimit (the singular values do not
-   converge). */
+    values without those up to n times 2.2e-16 of the largest. Where columns depend on each other, 6
+    gives the shortest of the solutions, and 0 one that rounding errors decide. Where wantCovariance
+    is not 0, `covariance` is the inverse of H^T |W| H (not scaled by the MSE), else 0 by 0.
+    Codes: ErrSizeMismatch (H, y and weights differ in length), ErrOutOfMemory (no memory, or the
+    host refused a resize), ErrOrderNotPositive (H has no columns), ErrPolynomialOrderTooHigh (less
+    rows than columns), ErrInvalidSelector (no such algorithm), ErrNonFiniteInput (H or a weight, or
+    with algorithm 5 a y, is not finite, where the method tests it), ErrSingularMatrix (algorithms 1
+    to 5 met a singular system), ErrIterationLimit (the singular values do not converge). */
 QX_API ErrorCode GenLSFit80_head(QX_IN DBL2D H, QX_IN DBL1D y, QX_IN DBL1D w, int32_t algorithm,
                                  int32_t wantCovariance, QX_OUT DBL1D coefficients,
                                  QX_OUT DBL1D fit, QX_OUT DBL2D covariance, QX_OUT double *mse);
@@ -104,8 +104,8 @@ QX_API ErrorCode GoodnessOfFit_head(QX_IN DBL1D y, QX_IN DBL1D fit, QX_IN DBL1D 
     multiplied by 1 + *lambda, and adds d to the coefficients. The code stands in *err and is the
     function result, too.
     Codes: ErrEmptyInput (the sizes are 0 or disagree), ErrOutOfMemory (no memory),
-   ErrNonFiniteInput (a diagonal element is not finite), ErrSingularMatrix (the system is singular,
-   or a new coefficient is NaN). */
+    ErrNonFiniteInput (a diagonal element is not finite), ErrSingularMatrix (the system is singular,
+    or a new coefficient is NaN). */
 QX_API ErrorCode GetNewCoef_head(QX_INOUT DBL1D coefficients, QX_IN DBL2D a, QX_IN DBL1D gradient,
                                  QX_IN const double *lambda, QX_OUT ErrorCode *err);
 

@@ -48,12 +48,13 @@ QX_API ErrorCode ExpFitCoef80_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, 
 
 /** y = a x^b for x above 0, by Gauss-Newton steps from the guess (a, b), or from the line through
     (ln x, ln |y|) with weights w y^2; the best step wins and its values take the place of y. A
-   guess that is not finite gives NaN. Codes: ErrSizeMismatch (the arrays differ in length),
-   ErrFewerThanTwo (less than two samples), ErrNonFiniteInput (a weight is NaN, or a sample or a
-   step's power not finite), ErrTooFewWeights (all weights but one are 0), ErrNotStrictlyPositive
-   (an x is not above 0), ErrPolynomialOrderTooHigh (less than two values have the sign of most),
-   ErrOutOfMemory (no memory), ErrIterationLimit (singular values do not converge),
-   WarnFitIncomplete (the guess has neither no values nor two). */
+    guess that is not finite gives NaN.
+    Codes: ErrSizeMismatch (the arrays differ in length), ErrFewerThanTwo (less than two samples),
+    ErrNonFiniteInput (a weight is NaN, or a sample or a step's power not finite), ErrTooFewWeights
+    (all weights but one are 0), ErrNotStrictlyPositive (an x is not above 0),
+    ErrPolynomialOrderTooHigh (less than two values have the sign of most), ErrOutOfMemory (no
+    memory), ErrIterationLimit (singular values do not converge), WarnFitIncomplete (the guess has
+    neither no values nor two). */
 QX_API ErrorCode PowerFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, double tolerance,
                                QX_IN DBL1D guess, QX_OUT double *a, QX_OUT double *b,
                                QX_OUT double *mse, QX_INOUT int32_t *iterations, double floor);
@@ -79,12 +80,13 @@ QX_API ErrorCode LogFitCoef_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, do
     the guess (a, c, s), or from the logarithms of what lies above a tenth of the peak; its values
     take the place of y. *iterations counts the trials. Steepest descent converges slowly where the
     sizes of a, c and s differ much, and ends by the tolerance then. A guess that is not finite
-   counts as none. A peak that alone lies above a tenth of its height is taken through three points,
-   and *iterations is 0. Codes: ErrSizeMismatch (the arrays differ in length), ErrFewerThanThree
-   (less than three samples), ErrNonFiniteInput (a weight is NaN, or an x not finite),
-   ErrTooFewWeights (less than three weights are not 0), ErrFitStartValues (the deviation to start
-   from is 0, or a lone peak has no neighbour of its sign on a side), ErrOutOfMemory (no memory),
-   WarnFitIncomplete (the guess has neither no values nor three). */
+    counts as none. A peak that alone lies above a tenth of its height is taken through three
+    points, and *iterations is 0.
+    Codes: ErrSizeMismatch (the arrays differ in length), ErrFewerThanThree (less than three
+    samples), ErrNonFiniteInput (a weight is NaN, or an x not finite), ErrTooFewWeights (less than
+    three weights are not 0), ErrFitStartValues (the deviation to start from is 0, or a lone peak
+    has no neighbour of its sign on a side), ErrOutOfMemory (no memory), WarnFitIncomplete (the
+    guess has neither no values nor three). */
 QX_API ErrorCode GaussianPeakFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w,
                                       double tolerance, QX_IN DBL1D guess, QX_OUT double *a,
                                       QX_OUT double *c, QX_OUT double *s, QX_OUT double *mse,
