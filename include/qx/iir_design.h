@@ -16,8 +16,9 @@
    pole has a section of its own, whose upper places are zero, and stands first. With n = (order +
    1) / 2 rounded down, lowpass and highpass have n sections of second order, or half of that,
    rounded up, of fourth order; the others have 2 n of second order or n of fourth order. A band
-   filter in second-order sections has been split by its roots, which a band far below the sampling
-   rate leaves with fewer digits.
+   filter is built in fourth order, and split by its roots where second order is asked for; in
+   either form bands far below the sampling rate have fewer digits than a highpass and a lowpass
+   one after the other.
 
    The code is in *err. Where the host refuses an array, the function result is its status. A
    failure empties both arrays. NaN in a frequency, ripple or attenuation makes coefficients NaN. */

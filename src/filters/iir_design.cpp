@@ -4,7 +4,6 @@
 #include "filters/section_forms.h"
 #include "frame/scratch.h"
 
-#include <cstring>
 #include <initializer_list>
 #include <limits>
 

@@ -197,7 +197,7 @@ ErrorCode Exchange::prepare() {
 
 // All weights get one power of 2 in common, which cancels where they are used.
 ErrorCode Exchange::formWeights() {
-    MultiplyDistances(x_.data(), r_, ad_.data(), exponent_.data());
+    MultiplyDistances({x_.data(), r_, ad_.data(), exponent_.data()});
     int32_t least = 0;
     for (int32_t j = 0; j < r_; ++j) {
         if (ad_[j] == 0.0)

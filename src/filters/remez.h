@@ -48,7 +48,13 @@ QX_BY_WIDTH(void, Interpolate, (const Interpolation &polynomial, const DBL *plac
 // The products of x[j] - x[k] over the other k in ascending order, for each j. As the products of
 // some hundred distances leave the range of a double, product[j] is to be multiplied by
 // 2^exponent[j].
-QX_BY_WIDTH(void, MultiplyDistances, (const DBL *x, int32_t count, DBL *product, I32 *exponent))
+struct Distances {
+    const DBL *x;
+    int32_t count;
+    DBL *product;
+    I32 *exponent;
+};
+QX_BY_WIDTH(void, MultiplyDistances, (const Distances &distances))
 
 } // namespace qx
 

@@ -52,8 +52,11 @@ QX_INLINE L WithOne(L lanes, int lane) {
 }
 
 template <class L>
-QX_INLINE void MultiplyDistancesOf(int32_t j, const DBL *x, int32_t count, DBL *product,
-                                   I32 *exponent) {
+QX_INLINE void MultiplyDistancesOf(int32_t j, const Distances &distances) {
+    const DBL *x = distances.x;
+    DBL *product = distances.product;
+    I32 *exponent = distances.exponent;
+    const int32_t count = distances.count;
     const L own = L::load(x + j);
     for (int lane = 0; lane < L::count; ++lane) {
         product[j + lane] = 1.0;
@@ -76,12 +79,12 @@ QX_INLINE void MultiplyDistancesOf(int32_t j, const DBL *x, int32_t count, DBL *
 
 } // namespace
 
-void MultiplyDistances(const DBL *x, int32_t count, DBL *product, I32 *exponent) {
+void MultiplyDistances(const Distances &distances) {
     int32_t j = 0;
-    for (; j + nativeLanes <= count; j += nativeLanes)
-        MultiplyDistancesOf<Lanes<nativeLanes>>(j, x, count, product, exponent);
-    for (; j < count; ++j)
-        MultiplyDistancesOf<Lanes<1>>(j, x, count, product, exponent);
+    for (; j + nativeLanes <= distances.count; j += nativeLanes)
+        MultiplyDistancesOf<Lanes<nativeLanes>>(j, distances);
+    for (; j < distances.count; ++j)
+        MultiplyDistancesOf<Lanes<1>>(j, distances);
 }
 
 void Interpolate(const Interpolation &polynomial, const DBL *places, DBL *values) {

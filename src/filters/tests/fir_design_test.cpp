@@ -134,7 +134,7 @@ double PeakOnGrid(const Signal &h, const Equiripple &design) {
     const double step = 0.5 / (16 * (design.n / 2 + (isOdd && isMultiband)));
     double peak = 0;
     for (const RemezBand &band : design.bands) {
-        const double from = isMultiband ? +band.fLow : std::max<double>(band.fLow, step);
+        const double from = isMultiband ? +band.fLow : std::max(+band.fLow, step);
         const auto steps = static_cast<int>((band.fHigh - from) / step);
         for (int k = 0; k <= steps; ++k) {
             const double f = k < steps ? from + k * step : +band.fHigh;
