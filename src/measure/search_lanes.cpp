@@ -30,9 +30,10 @@ struct Beyond {
     }
 };
 
+template <int Levels>
 struct BeyondOrCrossing {
     Beyond beyond;
-    double levelA, levelB;
+    double level[Levels];
 
     static QX_INLINE bool crosses(double here, double next, double level) {
         return (here <= level && next >= level) || (here >= level && next <= level);
@@ -42,33 +43,37 @@ struct BeyondOrCrossing {
                ((here.v >= level.v) & (next.v <= level.v));
     }
     QX_INLINE bool one(int32_t i) const {
-        const double here = beyond.y[i], next = beyond.y[i + 1];
-        return beyond.one(i) || crosses(here, next, levelA) || crosses(here, next, levelB);
+        bool found = beyond.one(i);
+        for (int k = 0; k < Levels; ++k)
+            found |= crosses(beyond.y[i], beyond.y[i + 1], level[k]);
+        return found;
     }
     QX_INLINE auto many(int32_t i) const {
         const L here = L::load(beyond.y + i), next = L::load(beyond.y + i + 1);
-        return beyond.many(i) | crosses(here, next, L(levelA)) | crosses(here, next, L(levelB));
+        auto found = beyond.many(i);
+        for (int k = 0; k < Levels; ++k)
+            found |= crosses(here, next, L(level[k]));
+        return found;
     }
 };
 
 template <class Test>
 QX_INLINE int32_t First(int32_t from, int32_t end, const Test &test) {
-    // The next event of a lively waveform is near, and a vector would look too far.
+    // The next event of a lively waveform is near, so the first vectors are looked at one by one.
     int32_t i = from;
-    for (const int32_t near = end - from < 6 ? end : from + 6; i < near; ++i)
-        if (test.one(i))
-            return i;
+    for (int k = 0; k < together && end - i >= nativeLanes; ++k, i += nativeLanes)
+        if (const unsigned bits = BitsOf(test.many(i)))
+            return i + __builtin_ctz(bits);
     for (; end - i >= stride; i += stride) {
         auto any = test.many(i);
         for (int k = 1; k < together; ++k)
             any |= test.many(i + k * nativeLanes);
-        if (__builtin_expect(BitsOf(any) != 0, 0)) {
-            unsigned bits = 0;
-            for (int k = 0; k < together; ++k)
-                bits |= BitsOf(test.many(i + k * nativeLanes)) << (k * nativeLanes);
-            return i + __builtin_ctz(bits);
-        }
+        if (__builtin_expect(BitsOf(any) != 0, 0))
+            break;
     }
+    for (; end - i >= nativeLanes; i += nativeLanes)
+        if (const unsigned bits = BitsOf(test.many(i)))
+            return i + __builtin_ctz(bits);
     for (; i < end; ++i)
         if (test.one(i))
             return i;
@@ -83,7 +88,9 @@ int32_t FirstBeyond(const DBL *y, int32_t from, int32_t end, double lower, doubl
 
 int32_t FirstBeyondOrCrossing(const DBL *y, int32_t from, int32_t end, double lower, double upper,
                               double levelA, double levelB) {
-    return First(from, end, BeyondOrCrossing{{y, lower, upper}, levelA, levelB});
+    const Beyond beyond = {y, lower, upper};
+    return levelB != levelB ? First(from, end, BeyondOrCrossing<1>{beyond, {levelA}})
+                            : First(from, end, BeyondOrCrossing<2>{beyond, {levelA, levelB}});
 }
 
 } // namespace qx::QX_WIDTH

@@ -1,0 +1,1 @@
+qx_bench(measure SOURCES measure.cpp)

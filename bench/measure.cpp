@@ -1,0 +1,144 @@
+// The window scan of the peak detector, and the search for crossings.
+//
+// Peers: for the scan three plain dot products for each window, as the definition has them; for
+// crossings the time in which the same data are read and summed, and the plain loop over the
+// samples.
+
+#include "bench/host_memory.h"
+#include "bench/timing.h"
+#include "measure/crossings.h"
+#include "measure/parabolas.h"
+#include "measure/peaks.h"
+
+#include <cmath>
+#include <cstdint>
+#include <numbers>
+#include <string>
+#include <vector>
+
+namespace {
+
+using qx::bench::HostMemory;
+using qx::bench::Keep;
+using qx::bench::MedianTimes;
+using qx::bench::Ratios;
+
+void Fill(DBL *x, int32_t n, double (*value)(int32_t i)) {
+    for (int32_t i = 0; i < n; ++i)
+        x[i] = value(i);
+}
+
+double Sine(int32_t i) { return std::sin(0.01 * i); }
+double Noise(int32_t i) {
+    return static_cast<double>(static_cast<uint32_t>(i) * 2654435761U % 1000003U) / 1000003.0;
+}
+
+// Three dot products, each kept, and nothing else.
+void PlainScan(const DBL *fitMatrix, int32_t w, const DBL *x, int32_t n) {
+    double sum = 0;
+    for (int32_t i = 0; i + w <= n; ++i) {
+        const qx::Parabola p = qx::FitWindow(fitMatrix, w, x + i);
+        sum += p.c0 + p.c1 + p.c2;
+    }
+    Keep(sum);
+}
+
+void Scans() {
+    constexpr int32_t n = 100000;
+    Ratios over("window scan of the peak detector");
+    const HostMemory x(n);
+    struct Signal {
+        const char *name;
+        double (*value)(int32_t i);
+    };
+    for (const auto &[name, value] : {Signal{"sine", Sine}, {"noise", Noise}}) {
+        Fill(x.data(), n, value);
+        for (const int32_t w : {3, 4, 5, 9, 33, 101, 1001}) {
+            std::vector<double> buffer(static_cast<std::size_t>(qx::PeakBufferLength(w)));
+            PeakDState state = {};
+            state.width = w;
+            qx::PointInto(buffer.data(), w, &state);
+            const qx::PeakBlock block{x.data(), n, 0.5, true, true, false, false};
+            const auto [ours, plain] = MedianTimes(
+                [&] {
+                    qx::PeakList found = qx::ListFor(block, state);
+                    qx::PeakDetectStep(block, &state, &found);
+                    Keep(found.size());
+                },
+                [&] { PlainScan(state.fitMatrix, w, x.data(), n); });
+            std::printf("scan %-6s width %5d %8.3f ns a window  plain dot products %5.2f\n", name,
+                        w, ours / n * 1e9, ours / plain);
+            over.add(ours / plain, std::string(name) + ", width " + std::to_string(w));
+        }
+    }
+    over.summary("three dot products a window");
+}
+
+// The rules of the search, sample by sample.
+int32_t PlainCrossings(const DBL *y, int32_t n, double mid, double h, qx::Crossing *list,
+                       int32_t limit) {
+    int32_t state = 2, count = 0;
+    bool isArmed = false;
+    for (int32_t i = 0; i < n - 1 && count < limit; ++i) {
+        if (y[i] >= mid + h && state != 0) {
+            isArmed = true;
+            state = 0;
+        } else if (y[i] <= mid - h && state != 1) {
+            isArmed = true;
+            state = 1;
+        } else if (!isArmed) {
+            continue;
+        }
+        if ((y[i] - mid) * (y[i + 1] - mid) <= 0) {
+            list[count++] = {(y[i] - mid) / (y[i] - y[i + 1]) + i, state};
+            isArmed = false;
+        }
+    }
+    return count;
+}
+
+// What reading the data takes: sums side by side, so that no addition waits for another.
+double SumInVectors(const DBL *x, int32_t n) {
+    constexpr int together = 32;
+    double sums[together] = {};
+    for (int32_t i = 0; i + together <= n; i += together)
+        for (int k = 0; k < together; ++k)
+            sums[k] += x[i + k];
+    double sum = 0;
+    for (const double part : sums)
+        sum += part;
+    return sum;
+}
+
+void Crossings() {
+    Ratios overMemory("search for crossings"), overPlain("search for crossings");
+    for (const int32_t n : {10000, 1000000, 10000000}) {
+        const HostMemory y(static_cast<std::size_t>(n));
+        std::vector<qx::Crossing> list(static_cast<std::size_t>(n));
+        // One crossing in so many samples.
+        for (const int32_t every : {20, 300, 10000}) {
+            for (int32_t i = 0; i < n; ++i)
+                y.data()[i] = std::sin(std::numbers::pi * (i + 0.5) / every) + 1e-3 * Noise(i);
+            const auto [ours, plain, reading] = MedianTimes(
+                [&] { Keep(qx::FindMidCrossings(0, y.data(), n, 0, 0.5, list.data(), n)); },
+                [&] { Keep(PlainCrossings(y.data(), n, 0, 0.5, list.data(), n)); },
+                [&] { Keep(SumInVectors(y.data(), n)); });
+            std::printf(
+                "crossings n %9d, one in %6d %7.3f ns a sample  reading %5.2f  plain %5.2f\n", n,
+                every, ours / n * 1e9, ours / reading, ours / plain);
+            const std::string name = std::to_string(n) + ", one in " + std::to_string(every);
+            overMemory.add(ours / reading, name);
+            overPlain.add(ours / plain, name);
+        }
+    }
+    overMemory.summary("sum of the data in vectors");
+    overPlain.summary("loop over the samples");
+}
+
+} // namespace
+
+int main() {
+    Scans();
+    Crossings();
+    return 0;
+}
