@@ -209,8 +209,8 @@ public:
                 continue;
             }
             std::swap(current_, trial_);
-            // A cost of 0, or one that stays, falls by no part of itself, however small.
-            if (before - after < before * tolerance || before == after || after == 0.0)
+            // A cost that stays, as 0 does, falls by no part of itself, however small.
+            if (before - after < before * tolerance || before == after)
                 return 0;
             *lambda *= 0.4;
             if (k == limit)

@@ -216,6 +216,42 @@ TEST_F(BoundedFitSums, BisquareLeavesOutWhatLiesFarOff) {
               SumsAt(core.model, exact, core.p, qx::leastSquares).a);
 }
 
+// The cost of a line whose last sample has most of the leverage, from the definition of the
+// weights.
+TEST_F(BoundedFitSums, BisquareAllowsForLeverage) {
+    const qx::FitModel model = {2,
+                                [](double at, const DBL *p, int32_t, const void *) {
+                                    return static_cast<double>(p[0] * at + p[1]);
+                                },
+                                nullptr, nullptr, nullptr};
+    x[n - 1] = 60.0;
+    const std::vector<DBL> p = {0.3, 0.2};
+    long double mean = 0, spread = 0, cost = 0;
+    for (const double at : x)
+        mean += at / static_cast<long double>(n);
+    for (const double at : x)
+        spread += (at - mean) * (at - mean);
+    const auto median = [](std::vector<long double> values) {
+        std::sort(values.begin(), values.end());
+        return values[n / 2];
+    };
+    std::vector<long double> r(n), adjusted(n), distance(n);
+    for (std::size_t i = 0; i < n; ++i) {
+        const long double leverage = 1.0L / n + (x[i] - mean) * (x[i] - mean) / spread;
+        r[i] = y[i] - (static_cast<long double>(p[0]) * x[i] + p[1]);
+        adjusted[i] = r[i] / std::sqrt(1 - leverage);
+    }
+    for (std::size_t i = 0; i < n; ++i)
+        distance[i] = std::fabs(adjusted[i] - median(adjusted));
+    const long double unit = 4.685L * median(distance) / 0.6745L;
+    for (std::size_t i = 0; i < n; ++i) {
+        const long double u = std::min(1.0L, std::fabs(adjusted[i] / unit));
+        cost += (1 - u * u) * (1 - u * u) * r[i] * r[i] / n;
+    }
+    const qx::FitSamples samples = {x, y, nullptr, n};
+    EXPECT_NEAR(SumsAt(model, samples, p, qx::bisquare).cost, static_cast<double>(cost), 1e-9);
+}
+
 TEST(BoundedLM, ChecksItsArguments) {
     const qx::FitModel model = qx::FitModelOf<qx::ExponentialModel>();
     const DBL x[] = {0, 1, 2}, y[] = {1, 2, 4}, low[] = {0, 0, 0}, high[] = {1, -1, 1};
@@ -500,6 +536,22 @@ TEST(BoundedFits, RobustMethodsDoNotFollowOutliers) {
     }
 }
 
+// Far off, and all on one side of a plain fit.
+TEST(BoundedFits, BisquareBeginsWhereTheBulkOfTheDataLies) {
+    for (const char *const name : {"line", "logarithm"}) {
+        const Values p = {2.5, 1.5};
+        const auto &[model, range] = models.at(name);
+        Fit f = Sampled(model, p, 0.5, 5, 60, 0.05, 4);
+        for (std::size_t i = 0; i < 60; i += 7)
+            f.y[i] += 8 + static_cast<double>(i) / 7;
+        f.method = qx::bisquare;
+        f(name);
+        EXPECT_EQ(f.status, 0);
+        EXPECT_NEAR(f.p[0], p[0], 0.03) << name;
+        EXPECT_NEAR(f.p[1], p[1], 0.03) << name;
+    }
+}
+
 // Frames.
 
 TEST(BoundedFits, CheckTheirArguments) {
@@ -648,7 +700,7 @@ TEST(BoundedFits, TakeFixedCoefficientsForSamples) {
                 for (const double value : test.p)
                     f.guess.push_back(1.1 * value);
             for (std::size_t i = test.fixed.size(); i < test.p.size(); ++i) {
-                f.x.push_back(1.0 + 0.75 * static_cast<double>(f.x.size()));
+                f.x.push_back(1.25 + 0.75 * static_cast<double>(f.x.size()));
                 f.y.push_back(models.at(test.model).first(f.x.back(), test.p));
             }
             f.w.assign(f.x.size(), 0.5);
@@ -659,6 +711,13 @@ TEST(BoundedFits, TakeFixedCoefficientsForSamples) {
             for (std::size_t i = 0; i < test.p.size(); ++i)
                 EXPECT_NEAR(f.p[i], test.p[i], method == qx::bisquare ? 1e-2 : 1e-5);
         }
+    // Without a guess the bounds are the start: a deviation of 0 would be none.
+    Fit f;
+    f.x = {1, 2};
+    f.y = {3, 4};
+    f.lower = {-inf, 1.5, 1, -inf};
+    f.upper = {inf, 1.5, 1, inf};
+    EXPECT_EQ(f("gaussian").status, 0);
 }
 
 TEST(BoundedFits, EndAtTheirLimits) {
@@ -700,6 +759,18 @@ TEST(BoundedFits, KnowTheBasesOfLogarithms) {
             xx += t * t;
         }
         EXPECT_NEAR(f.p[0], xy / xx, 1e-6 * std::fabs(xy / xx)) << base;
+        // With a fixed it is linear in the logarithm of b.
+        f.iterations = 1000;
+        f.lower = f.upper = {2.5, 0};
+        f.lower[1] = -inf;
+        f.upper[1] = inf;
+        f("logarithm");
+        double sum = 0;
+        for (std::size_t i = 0; i < f.x.size(); ++i)
+            sum += f.y[i] * logOfBase / 2.5 - std::log(f.x[i]);
+        const double b = std::exp(sum / static_cast<double>(f.x.size()));
+        EXPECT_NEAR(f.p[1], b, 1e-6 * b) << base;
+        EXPECT_LT(f.iterations, 16) << base;
     }
 }
 
