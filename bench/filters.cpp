@@ -3,6 +3,7 @@
 // bench/scipy_filters.py.
 
 #include "bench/host_memory.h"
+#include "bench/own_host.h"
 #include "bench/timing.h"
 #include "fft/plan.h"
 #include "filters/cascade.h"
@@ -19,19 +20,6 @@
 #include <cstring>
 #include <string>
 #include <vector>
-
-// The host of the module: this program. Its arrays never change their size.
-extern "C" {
-__attribute__((visibility("default"))) extern const int32_t gQXRTVersion;
-const int32_t gQXRTVersion = 1;
-__attribute__((visibility("default"))) int32_t HostRegisterSweep(int32_t (*)(void *), void *,
-                                                                 int32_t) {
-    return 0;
-}
-__attribute__((visibility("default"))) int32_t HostBlockReshape(int32_t, int32_t, void *, int32_t) {
-    return 1;
-}
-}
 
 namespace {
 

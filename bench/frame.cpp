@@ -2,6 +2,7 @@
 // Scratch memory from the enabled workspace against malloc and free of the same sizes: request
 // and release in turn, and runs of eight requests released newest first, by one thread and four.
 
+#include "bench/own_host.h"
 #include "bench/timing.h"
 #include "fft/kernels/kernels.h"
 #include "frame/scratch.h"
@@ -13,19 +14,6 @@
 #include <cstdlib>
 #include <string>
 #include <thread>
-
-// The host that the workspace registers its sweep with: this program.
-extern "C" {
-__attribute__((visibility("default"))) extern const int32_t gQXRTVersion;
-const int32_t gQXRTVersion = 1;
-__attribute__((visibility("default"))) int32_t HostRegisterSweep(int32_t (*)(void *), void *,
-                                                                 int32_t) {
-    return 0;
-}
-__attribute__((visibility("default"))) int32_t HostBlockReshape(int32_t, int32_t, void *, int32_t) {
-    return 1;
-}
-}
 
 namespace {
 

@@ -2,7 +2,7 @@
 #include "linalg/lapack.h"
 #include "linalg/matrix.h"
 #include "linalg/products/products.h"
-#include "tests/support/recipe.h"
+#include "linalg/tests/matrices.h"
 
 #include <gtest/gtest.h>
 
@@ -14,22 +14,10 @@
 
 namespace {
 
-typedef std::complex<long double> Exact;
+using qx::test::Complexes;
+using qx::test::Reals;
 
-std::vector<CDB> Elements(std::size_t count, uint64_t seed) {
-    qx::test::Noise noise(seed);
-    std::vector<CDB> x(count);
-    for (CDB &z : x)
-        z = {noise.symmetric(), noise.symmetric()};
-    return x;
-}
-std::vector<double> Reals(std::size_t count, uint64_t seed) {
-    qx::test::Noise noise(seed);
-    std::vector<double> x(count);
-    for (double &value : x)
-        value = noise.symmetric();
-    return x;
-}
+typedef std::complex<long double> Exact;
 
 Exact Of(CDB z) { return {z.re, z.im}; }
 
@@ -55,7 +43,7 @@ double ErrorOfProduct(const std::vector<T> &a, const std::vector<T> &b, const st
 
 TEST(Products, TransposesAndConjugates) {
     const int m = 37, n = 21;
-    auto a = Elements(m * n, 1);
+    auto a = Complexes(m * n, 1);
     std::vector<CDB> t(m * n), product(m * m);
     qx::TransposeMatrix(a.data(), m, n, t.data());
     for (int i = 0; i < m; ++i)

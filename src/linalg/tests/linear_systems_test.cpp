@@ -19,9 +19,10 @@ namespace {
 using qx::ElementType;
 using qx::operator*;
 using qx::operator+=;
+using qx::test::Complexes;
 using qx::test::Deviation;
 using qx::test::Exact;
-using qx::test::Noise;
+using qx::test::Reals;
 
 typedef qx::test::Array1D<ElementType::DBL> DBLVector;
 typedef qx::test::Array1D<ElementType::CDB> CDBVector;
@@ -31,21 +32,6 @@ typedef qx::test::CDB2DArray CDBMatrix;
 
 constexpr double inf = std::numeric_limits<double>::infinity();
 const double nan = std::numeric_limits<double>::quiet_NaN();
-
-std::vector<double> Reals(int n, uint64_t seed) {
-    Noise noise(seed);
-    std::vector<double> x;
-    for (int i = 0; i < n; ++i)
-        x.push_back(noise.symmetric());
-    return x;
-}
-std::vector<CDB> Complexes(int n, uint64_t seed) {
-    Noise noise(seed);
-    std::vector<CDB> x;
-    for (int i = 0; i < n; ++i)
-        x.push_back({noise.symmetric(), noise.symmetric()});
-    return x;
-}
 
 // |b - a x| / (|a| |x|) in units of n eps: the backward error of a solution.
 template <class T>

@@ -10,6 +10,23 @@
 
 namespace qx::test {
 
+inline std::vector<double> Reals(int count, uint64_t seed) {
+    Noise noise(seed);
+    std::vector<double> x(static_cast<std::size_t>(count));
+    for (double &value : x)
+        value = noise.symmetric();
+    return x;
+}
+inline std::vector<CDB> Complexes(int count, uint64_t seed) {
+    Noise noise(seed);
+    std::vector<CDB> x(static_cast<std::size_t>(count));
+    for (CDB &z : x) {
+        z.re = noise.symmetric();
+        z.im = noise.symmetric();
+    }
+    return x;
+}
+
 // The kinds of matrices on which factorisations are tried: element (i, j) of an m by n matrix.
 struct MatrixKind {
     const char *name;
