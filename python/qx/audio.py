@@ -16,9 +16,9 @@ def is_audio(path, start):
     return start[:4] in STARTS or os.path.splitext(path)[1].lower() in ENDINGS and b"\0" in start
 
 
-def read(path, column, first, most):
+def read(path, column, first, most, whole):
     """Samples of one channel from a frame on, the rate, the channel from 1 and the numbers of
-    channels and frames."""
+    channels and frames. Where these are more than are kept, `whole` is given all of them."""
     import soundfile
     try:
         with soundfile.SoundFile(path) as file:
@@ -30,23 +30,26 @@ def read(path, column, first, most):
                 raise InputError(f"{path}: the file holds no samples")
             if not 0 <= first < frames:
                 raise InputError(f"{path}: has {frames} samples, none at {first}")
-            file.seek(first)
-            wanted = min(frames - first, most)
-            values, count = np.empty(wanted), 0
-            while count < wanted:
-                part = file.read(min(FRAMES_AT_ONCE, wanted - count), dtype="float64", always_2d=True)
-                if not len(part):
-                    break
-                values[count:count + len(part)] = part[:, channel - 1]
-                count += len(part)
+            values = _channel(path, file, channel, first, most, whole)
             rate = float(file.samplerate)
     except soundfile.LibsndfileError as error:
         reason = error.error_string.strip().rstrip(".")
         raise InputError(f"{path}: cannot be read as audio: {reason}") from None
-    if count == 0:
+    if not len(values):
         raise InputError(f"{path}: the file holds no samples")
-    values = values[:count]
-    wrong = np.flatnonzero(~np.isfinite(values))
-    if len(wrong):
-        raise InputError(f"{path}: sample {first + wrong[0] + 1} is not a finite number")
     return values, rate, channel, channels, frames
+
+
+def _channel(path, file, channel, first, most, whole):
+    kept, seen = [], 0
+    while len(part := file.read(FRAMES_AT_ONCE, dtype="float64", always_2d=True)):
+        part = part[:, channel - 1]
+        wrong = np.flatnonzero(~np.isfinite(part))
+        if len(wrong):
+            raise InputError(f"{path}: sample {seen + wrong[0] + 1} is not a finite number")
+        begin, end = max(0, first - seen), max(0, first + most - seen)
+        kept.append(part[begin:max(begin, end)].copy())
+        if file.frames > most:
+            whole.add(part)
+        seen += len(part)
+    return np.concatenate(kept) if kept else np.empty(0)

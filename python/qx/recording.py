@@ -12,6 +12,7 @@ import re
 import numpy as np
 
 from . import audio, tables
+from .calls import call
 from .tables import InputError  # noqa: F401, for those who read recordings
 
 WIDEST = 1e307  # with the margins of a plot still a double
@@ -28,6 +29,7 @@ class Recording:
     channel: str  # name of the column or channel
     notes: list  # comment lines of the file
     choice: str = ""  # what was taken from the file, and why
+    whole: object = None  # figures of the whole file (Whole) where the values are a part of it
 
     def times(self):
         """The abscissae of the samples: seconds, or sample numbers without a rate."""
@@ -36,6 +38,45 @@ class Recording:
     @property
     def time_unit(self):
         return "s" if self.rate else "samples"
+
+
+class Whole:
+    """Figures of a recording that is too long to be kept, part by part."""
+
+    BLOCK = 4096  # samples between two points of the outline
+
+    def __init__(self):
+        self.count, self.total, self.squares = 0, 0.0, 0.0
+        self.lows, self.highs, self._rest = [], [], np.empty(0)
+
+    def add(self, values):
+        if not len(values):
+            return
+        n = len(values)
+        self.count += n
+        self.total += n * call("Mean_head", values)
+        rms = call("RMS_head", values)
+        self.squares += n * (rms * rms)  # beyond all numbers perhaps, and no error
+        values = np.concatenate([self._rest, values])
+        blocks = values[:len(values) // self.BLOCK * self.BLOCK].reshape(-1, self.BLOCK)
+        if len(blocks):
+            self.lows.append(blocks.min(axis=1))
+            self.highs.append(blocks.max(axis=1))
+        self._rest = values[blocks.size:].copy()
+
+    def outline(self):
+        """The least and the greatest values of blocks one after the other, the last one shorter."""
+        rest = [self._rest] if len(self._rest) else []
+        return (np.concatenate([*self.lows, *([part.min()] for part in rest)]),
+                np.concatenate([*self.highs, *([part.max()] for part in rest)]))
+
+    @property
+    def mean(self):
+        return self.total / self.count
+
+    @property
+    def rms(self):
+        return (self.squares / self.count) ** 0.5
 
 
 NUMBER = r"(\d+(?:[.,]\d+)?(?:e\d+)?)\s*(k|M)?"
@@ -90,12 +131,13 @@ def read(path, rate=None, column=None, decimal=None, missing=None, start=0):
 
 
 def _of_audio(path, column, start):
-    values, rate, channel, channels, frames = audio.read(path, column, start, MOST_SAMPLES)
+    whole = Whole()
+    values, rate, channel, channels, frames = audio.read(path, column, start, MOST_SAMPLES, whole)
     others = f"; others: {_listed(f'channel {i + 1}' for i in range(channels) if i + 1 != channel)}"
     choice = f"channel {channel} of {channels}; {{rate}}{others * (channels > 1)}"
     choice += _part(start, len(values), frames)
     return Recording(os.path.basename(path), values, rate or None, "from the header of the file", "FS",
-                     f"channel {channel} of {channels}", [], choice)
+                     f"channel {channel} of {channels}", [], choice, whole if whole.count else None)
 
 
 def _listed(names, most=12):
@@ -107,9 +149,10 @@ def _part(start, count, all_of_them):
     """What is told where the memory holds a part of a recording only."""
     if count == all_of_them:
         return ""
-    of = f" of {all_of_them}" if all_of_them else ""
+    of = f" of {all_of_them}"
     return (f"; samples {start + 1} to {start + count}{of}, since at most {MOST_SAMPLES} are analysed at "
-            "once (--start takes others)")
+            "once (--start takes others)" if all_of_them > MOST_SAMPLES else
+            f"; without the first {start} samples")
 
 
 def _of_table(path, column, decimal, missing, start):
@@ -118,7 +161,7 @@ def _of_table(path, column, decimal, missing, start):
     times, indices = _roles(reader)
     chosen = _column(path, reader, times, indices, column)
     time = _time_column(reader, [c for c in times if c != chosen])
-    values, seconds, more = _columns(reader, chosen, time, start)
+    values, seconds, whole = _columns(reader, chosen, time, start)
     if not len(values):
         raise InputError(f"{path}: has no value from sample {start + 1} on")
     said = []
@@ -144,8 +187,10 @@ def _of_table(path, column, decimal, missing, start):
     others = [_named(layout, c, c in indices) for c in range(layout.width) if c not in (chosen, time)]
     if others:
         parts.append(f"others: {_listed(others)}")
-    choice = "; ".join(parts + said) + (_part(start, len(values), 0) if more or start else "")
-    return Recording(os.path.basename(path), values, rate, source, unit, label, reader.notes, choice)
+    choice = "; ".join(parts + said) + _part(start, len(values), whole.count)
+    is_part = whole.count > MOST_SAMPLES
+    return Recording(os.path.basename(path), values, rate, source, unit, label, reader.notes, choice,
+                     whole if is_part else None)
 
 
 def _named(layout, column, is_index):
@@ -210,20 +255,18 @@ def _time_column(reader, times):
 
 
 def _columns(reader, chosen, time, start):
-    """The values, the times or None, and whether there are more than are kept."""
+    """The values and the times, or None, from a sample on, and the figures of all."""
     columns = [chosen] if time is None else [chosen, time]
-    kept, seen, more = {c: [] for c in columns}, 0, False
+    kept, seen, whole = {c: [] for c in columns}, 0, Whole()
     for part, _ in reader.parts(columns):
         count = len(part[chosen])
-        first, last = max(0, start - seen), min(count, start + MOST_SAMPLES - seen)
+        first, last = max(0, start - seen), max(0, start + MOST_SAMPLES - seen)
         seen += count
         for c in columns:
             kept[c].append(part[c][first:max(first, last)])
-        if last < count:
-            more = True
-            break
+        whole.add(part[chosen][~np.isnan(part[chosen])])
     joined = {c: np.concatenate(parts) if parts else np.empty(0) for c, parts in kept.items()}
-    return joined[chosen], joined.get(time), more
+    return joined[chosen], joined.get(time), whole
 
 
 def _without_holes(path, values, seconds, holes, missing):

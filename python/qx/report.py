@@ -143,7 +143,10 @@ def overview(recording):
     plt = _pyplot()
     times = recording.times()
     figure, axes = plt.subplots(figsize=(10, 2.9))
-    _trace(axes, times, recording.values, color=BLUE, linewidth=0.7)
+    if recording.whole:
+        _outline(axes, recording)
+    else:
+        _trace(axes, times, recording.values, color=BLUE, linewidth=0.7)
     axes.set(title="The whole recording", xlabel=f"Time ({recording.time_unit})",
              ylabel=quantity(recording))
     axes.margins(x=0.005)
@@ -164,7 +167,29 @@ def overview(recording):
         text = f"{counted}; the sampling rate is not known."
     if unit:
         text += f" Values in {unit}."
-    return Section("Recording", text, figures=figures)
+    return Section("Recording", text, _rows_of_whole(recording), figures)
+
+
+def _outline(axes, recording):
+    lows, highs = recording.whole.outline()
+    group = -(-len(lows) // 4000)
+    starts = np.arange(0, len(lows), group)
+    axes.fill_between(starts * recording.whole.BLOCK / (recording.rate or 1.0),
+                      np.minimum.reduceat(lows, starts), np.maximum.reduceat(highs, starts), color=BLUE,
+                      linewidth=0.4)
+
+
+def _rows_of_whole(recording):
+    """Figures of the whole file where the other sections have a part of it."""
+    whole, unit = recording.whole, recording.unit
+    if not whole:
+        return []
+    lows, highs = whole.outline()
+    return [Row("Samples in the file", str(whole.count), "", "read in parts"),
+            Row("Mean of all", number(whole.mean), unit, "Mean_head"),
+            Row("Root mean square of all", number(whole.rms), unit, "RMS_head"),
+            Row("Lowest of all", number(lows.min()), unit, "read in parts"),
+            Row("Highest of all", number(highs.max()), unit, "read in parts")]
 
 
 def _excerpt(recording):

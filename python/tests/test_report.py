@@ -20,7 +20,7 @@ PYTHON = Path(__file__).resolve().parent.parent
 sys.path.insert(0, str(PYTHON))
 import qx  # noqa: E402
 from qx import __main__ as command  # noqa: E402
-from qx import recording, report, tables  # noqa: E402
+from qx import audio, recording, report, tables  # noqa: E402
 
 ECG = PYTHON.parent / "examples/data/ecg_208_360hz.csv"
 
@@ -39,6 +39,18 @@ class InFolder(unittest.TestCase):
         folder = tempfile.TemporaryDirectory()
         self.addCleanup(folder.cleanup)
         self.folder = Path(folder.name)
+
+    def drawn(self, text):
+        """Every figure is well-formed, in two sizes. Gives the texts in the drawings."""
+        figures = re.findall(r"<figure>(.*?)</figure>", text, re.DOTALL)
+        shown = []
+        for figure in figures:
+            drawings = re.findall(r'<svg class="(\w+)".*?</svg>', figure, re.DOTALL)
+            self.assertEqual(drawings, ["wide", "narrow"])
+            for drawing in re.findall(r"<svg.*?</svg>", figure, re.DOTALL):
+                root = xml.etree.ElementTree.fromstring(drawing)
+                shown += ["".join(part.itertext()) for part in root.iter("{http://www.w3.org/2000/svg}text")]
+        return shown
 
     def file(self, content, name="data.csv"):
         path = self.folder / name
@@ -164,11 +176,24 @@ class Reading(InFolder):
             with mock.patch.object(recording, "MOST_SAMPLES", 200):
                 read = self.read(text, start=150)
                 self.assertEqual(read.values.tolist(), [i % 7 for i in range(150, 350)])
-                self.assertIn("samples 151 to 350", read.choice)
+                self.assertIn("samples 151 to 350 of 999", read.choice)
+                everything = np.array([i % 7 for i in range(1000) if i != 700])
+                self.assertAlmostEqual(read.whole.mean, everything.mean(), delta=1e-12)
+                self.assertAlmostEqual(read.whole.rms, np.sqrt(np.mean(everything**2)), delta=1e-12)
                 samples = [struct.pack("<h", v) for v in range(500)]
                 read = self.read(wav(samples), "a.wav", start=250)
                 self.assertEqual((32768 * read.values).tolist(), [*range(250, 450)])
                 self.assertIn("samples 251 to 450 of 500", read.choice)
+                with mock.patch.object(recording.Whole, "BLOCK", 64), \
+                        mock.patch.object(audio, "FRAMES_AT_ONCE", 90):
+                    read = self.read(wav(samples), "a.wav")
+                    lows, highs = read.whole.outline()
+                    self.assertEqual((32768 * lows).tolist(), [*range(0, 500, 64)])
+                    self.assertEqual((32768 * highs).tolist(), [*range(63, 500, 64), 499])
+                    section = report.overview(read)
+                self.assertEqual({row.label: row.value for row in section.rows}["Samples in the file"], "500")
+                self.drawn("".join(f"<figure>{figure}</figure>" for figure in section.figures))
+            self.assertIn("without the first 150 samples", self.read(text, start=150).choice)
 
     def test_audio_files(self):
         for samples, form, bits in (
@@ -227,18 +252,6 @@ class Reading(InFolder):
 
 
 class Report(InFolder):
-    def drawn(self, text):
-        """Every figure is well-formed, in two sizes. Gives the texts in the drawings."""
-        figures = re.findall(r"<figure>(.*?)</figure>", text, re.DOTALL)
-        shown = []
-        for figure in figures:
-            drawings = re.findall(r'<svg class="(\w+)".*?</svg>', figure, re.DOTALL)
-            self.assertEqual(drawings, ["wide", "narrow"])
-            for drawing in re.findall(r"<svg.*?</svg>", figure, re.DOTALL):
-                root = xml.etree.ElementTree.fromstring(drawing)
-                shown += ["".join(part.itertext()) for part in root.iter("{http://www.w3.org/2000/svg}text")]
-        return shown
-
     def made(self, values, name="data.csv", unit="V", channel="u"):
         """The lines and the page of a report."""
         page = self.folder / "report.html"
