@@ -2,6 +2,7 @@
 #define QX_FIT_MODELS_H
 
 #include "fit/bounded_lm.h"
+#include "fit/model_sums.h"
 #include "frame/constants.h"
 
 #include <cmath>
@@ -14,6 +15,7 @@ namespace qx {
 // a exp(b x) + c
 struct ExponentialModel {
     static constexpr int32_t count = 3;
+    static constexpr auto &inLanes = ExponentialSums;
     static double value(double x, const DBL *p, const void *) {
         return p[0] * std::exp(p[1] * x) + p[2];
     }
@@ -36,6 +38,7 @@ struct PowerModel {
 // a exp(-0.5 ((x - m) / s)^2) + c
 struct GaussianModel {
     static constexpr int32_t count = 4;
+    static constexpr auto &inLanes = GaussianSums;
     static double value(double x, const DBL *p, const void *) {
         const double z = (x - p[1]) / p[2];
         return p[0] * std::exp(-0.5 * (z * z)) + p[3];
@@ -82,6 +85,25 @@ void NormalEquations(const FitSamples &samples, const DBL *p, int32_t, double *m
     }
 }
 
+// The same in lanes, for models that have it.
+template <class Model>
+void NormalEquationsInLanes(const FitSamples &samples, const DBL *p, int32_t count, double *mse,
+                            DBL *a, DBL *jacobian, DBL *g, const void *user) {
+    if (jacobian != nullptr) {
+        NormalEquations<Model>(samples, p, count, mse, a, jacobian, g, user);
+        return;
+    }
+    DBL sums[SumsOfModel(Model::count)];
+    Model::inLanes(samples.x, samples.y, samples.w, samples.n, p, sums);
+    *mse = sums[0] / samples.n;
+    const DBL *next = sums + 1;
+    for (int32_t i = 0; i < Model::count; ++i) {
+        for (int32_t j = 0; j <= i; ++j)
+            a[i * Model::count + j] = a[j * Model::count + i] = *next++;
+        g[i] = *next++;
+    }
+}
+
 // The model as the iteration takes it; `user` is what its functions are handed.
 template <class Model>
 FitModel FitModelOf(const void *user = nullptr) {
@@ -95,7 +117,13 @@ FitModel FitModelOf(const void *user = nullptr) {
                 for (int32_t i = 0; i < Model::count; ++i)
                     out[i] = d[i];
             },
-            NormalEquations<Model>, user};
+            [] {
+                if constexpr (requires { Model::inLanes; })
+                    return NormalEquationsInLanes<Model>;
+                else
+                    return NormalEquations<Model>;
+            }(),
+            user};
 }
 
 } // namespace qx
