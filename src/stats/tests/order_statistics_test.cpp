@@ -183,8 +183,9 @@ TEST(Order, NoDataMakeTheWorkQuadratic) {
         EXPECT_EQ(a[n / 2], sorted[n / 2]);
         EXPECT_LE(*std::max_element(a.begin(), a.begin() + n / 2), a[n / 2]);
         const auto tail = a.end() - n / 3; // of what the first passes leave
-        if (x == adversary.values())
+        if (x == adversary.values()) {
             EXPECT_TRUE(std::is_sorted(tail, a.end()));
+        }
     }
 }
 
