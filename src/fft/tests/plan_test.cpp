@@ -124,8 +124,8 @@ TEST(Plan, HoldsTheRootsAtTheirPlaces) {
             for (int32_t j = 1; j < p; ++j) {
                 const int32_t at = (k - 1) * (p - 1) + j - 1;
                 const long double angle = turn * j * k / n;
-                ASSERT_NEAR(table.stages[s]->twiddleCos[at], std::cos(angle), 1e-14);
-                ASSERT_NEAR(table.stages[s]->twiddleSin[at], -std::sin(angle), 1e-14);
+                ASSERT_NEAR(table.stages[s]->twiddleCos[at], std::cos(angle), 1.8e-15);
+                ASSERT_NEAR(table.stages[s]->twiddleSin[at], -std::sin(angle), 1.8e-15);
             }
         }
         n /= p;

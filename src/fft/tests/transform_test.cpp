@@ -234,8 +234,8 @@ TEST(Transform, LeafKernelsTakeColumns) {
                 real.insert(real.end(), {x[2 * (i + j * count)], 0});
             }
             const DBL *const results = &y[2 * i * p];
-            EXPECT_LT(WorstComplex(Definition(column), results, results + 1, 2), 3e-15 * p);
-            EXPECT_LT(WorstHalf(Definition(real), &h[i * p], 1), 3e-15 * p);
+            EXPECT_LT(WorstComplex(Definition(column), results, results + 1, 2), 4e-16 * p);
+            EXPECT_LT(WorstHalf(Definition(real), &h[i * p], 1), 4e-16 * p);
         }
     }
 }
