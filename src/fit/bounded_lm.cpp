@@ -190,7 +190,7 @@ public:
         for (int32_t &k = *steps; limit < 0 || k <= limit; ++k) {
             if (const ErrorCode failed = propose(*lambda))
                 return failed;
-            if (method_ == bisquare && largestChange() <= tolerance)
+            if (method_ == bisquare && std::isfinite(current_.cost) && largestChange() <= tolerance)
                 return 0;
             if (const ErrorCode failed = evaluate(trial_))
                 return failed;
