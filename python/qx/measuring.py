@@ -48,6 +48,7 @@ def peaks(values, threshold=None, width=5, valleys=False):
 EVENT_SECONDS = 0.1  # what lasts about so long, such as the steep part of a heart beat
 EVENT_SAMPLES = 36  # where the rate is not known
 STEPS = 6  # of the activity in that time
+QUIET = 1.5  # bursts stand so far above what lies between them; tones, noise and drifts reach 0.9
 REFRACTORY = 2.5  # events follow each other no faster, in its multiples
 
 
@@ -80,7 +81,10 @@ def events(values, rate):
         return np.zeros(0)
     strength = activity(values, step)
     largest = np.sort(strength)[-(len(strength) // 10):]
-    bursts = peaks(strength, call("Median_head", largest) / 2, 9)
+    level = call("Median_head", largest) / 2
+    if level <= QUIET * call("Median_head", strength):
+        return np.zeros(0)
+    bursts = peaks(strength, level, 9)
     centres = separated(bursts.places, bursts.values, REFRACTORY * STEPS) * step + (step - 1) / 2
     found = []
     for centre in centres:

@@ -58,7 +58,9 @@ class Events(unittest.TestCase):
                 np.testing.assert_allclose(found, places, atol=0.02)
 
     def test_nothing_repeats(self):
-        for values in (np.zeros(5000), np.zeros(10), np.arange(3000.0), np.r_[np.zeros(2000), 1.0]):
+        noise = np.random.default_rng(5).normal(size=20000)
+        for values in (np.zeros(5000), np.zeros(10), np.arange(3000.0), np.r_[np.zeros(2000), 1.0],
+                       noise, np.cumsum(noise), np.sin(0.05 * np.arange(9000))):
             self.assertEqual(len(measuring.events(values, None)), 0)
             self.assertIsNone(sections_measuring.events(recorded(values)))
 

@@ -74,12 +74,11 @@ def peaks(options):
     tell(options, names, rows)
 
 
-def pulses_of(read, options):
+def event_pulses(read):
+    """The pulses of all events, with places in the whole recording."""
     import dataclasses
 
     from .. import measuring
-    if not options.events:
-        return measuring.pulses(read.values, measuring.FALLING if options.falling else measuring.RISING)
     places = measuring.events(read.values, read.rate)
     found = filter(None, (measuring.event_pulse(read.values, places, i) for i in range(len(places))))
     return [dataclasses.replace(one, start=one.start + part.start, end=one.end + part.start,
@@ -87,16 +86,25 @@ def pulses_of(read, options):
 
 
 def pulse(options):
+    from .. import measuring
     from ..tables import InputError
     read, step = opened(options)
-    found = pulses_of(read, options)
-    if len(found) < options.number:
-        raise InputError(f"{options.file}: there is no pulse {options.number} among its {len(found)} "
-                         + ("events" if options.events else
-                            f"pulses with a {'falling' if options.falling else 'rising'} first edge"))
-    one = found[options.number - 1]
+    direction = measuring.FALLING if options.falling else measuring.RISING
+    found = None  # all of them, where they are needed
+    if options.events:
+        found = event_pulses(read)
+    elif options.csv:
+        found = measuring.pulses(read.values, direction)
+    if found is None:
+        one = measuring.pulse(read.values, options.number, direction)
+    else:
+        one = found[options.number - 1] if options.number <= len(found) else None
+    if one is None:
+        kind = "falling" if options.falling else "rising"
+        raise InputError(f"{options.file}: there is no pulse {options.number}" + (
+            "" if options.events else f" that begins with a {kind} edge"))
     unit, time = read.unit or "", read.time_unit
-    print(f"{read.name}: pulse {options.number} of {len(found)}")
+    print(f"{read.name}: pulse {options.number}" + (f" of {len(found)}" if found else ""))
     for label, value, its_unit in (
             ("low level", one.low, unit), ("high level", one.high, unit), ("start", one.start * step, time),
             ("end", one.end * step, time), ("width at half height", one.width * step, time),
