@@ -15,7 +15,7 @@ namespace {
 using qx::PlanReference;
 using qx::bench::Cell;
 using qx::bench::FFTWPlan;
-using qx::bench::MedianTimes;
+using qx::bench::LeastTimes;
 using qx::bench::Ratios;
 
 #ifdef QX_PEER_FFTW3
@@ -80,11 +80,12 @@ private:
 };
 
 struct Totals {
-    Ratios complexEstimate{"complex transform, estimate"};
-    Ratios complexMeasure{"complex transform, measure"};
-    Ratios realEstimate{"real transform, estimate"};
-    Ratios realMeasure{"real transform, measure"};
-    Ratios realComplex{"real transform"};
+    explicit Totals(const std::string &lengths)
+        : complexEstimate("complex transform, " + lengths), complexMeasure(complexEstimate),
+          realEstimate("real transform, " + lengths), realMeasure(realEstimate),
+          realComplex(realEstimate) {}
+
+    Ratios complexEstimate, complexMeasure, realEstimate, realMeasure, realComplex;
 
     void summary() const {
         complexEstimate.summary("FFTW, FFTW_ESTIMATE");
@@ -92,13 +93,6 @@ struct Totals {
         realEstimate.summary("FFTW r2c, FFTW_ESTIMATE");
         realMeasure.summary("FFTW r2c, FFTW_MEASURE");
         realComplex.summary("our complex transform");
-    }
-
-    void print(const char *group) const {
-        std::printf("-- %s\n", group);
-        for (const Ratios *ratios :
-             {&complexEstimate, &complexMeasure, &realEstimate, &realMeasure, &realComplex})
-            ratios->print();
     }
 };
 
@@ -114,7 +108,7 @@ void Compare(int32_t n, bool cold, Totals &group, Totals &all) {
 #ifdef QX_PEER_FFTW3
         const Peer estimate(n, real, FFTW_ESTIMATE, copies);
         const Peer measure(n, real, FFTW_MEASURE, copies);
-        const auto times = MedianTimes(ours, estimate, measure);
+        const auto times = LeastTimes(ours, estimate, measure);
         for (Totals *totals : {&group, &all}) {
             (real ? totals->realEstimate : totals->complexEstimate).add(times[0] / times[1], name);
             (real ? totals->realMeasure : totals->complexMeasure).add(times[0] / times[2], name);
@@ -122,7 +116,7 @@ void Compare(int32_t n, bool cold, Totals &group, Totals &all) {
         ratios[real][0] = times[0] / times[1];
         ratios[real][1] = times[0] / times[2];
 #else
-        const auto times = MedianTimes(ours);
+        const auto times = LeastTimes(ours);
 #endif
         oursTimes[real] = times[0];
     }
@@ -137,50 +131,58 @@ void Compare(int32_t n, bool cold, Totals &group, Totals &all) {
 
 struct Group {
     const char *name;
+    const char *about;
     std::vector<int32_t> lengths;
     bool cold;
 };
 
 std::vector<Group> Groups() {
-    Group small = {"small", {}, false};
+    Group small = {"small", "2 to 64", {}, false};
     for (int32_t n = 2; n <= 64; ++n)
         small.lengths.push_back(n);
-    Group powers = {"powers", {}, false};
+    Group powers = {"powers", "2^7 to 2^20", {}, false};
     for (int32_t n = 128; n <= 1 << 20; n *= 2)
         powers.lengths.push_back(n);
-    return {
-        small,
-        powers,
-        {"tens", {100, 1000, 10000, 100000, 1000000}, false},
-        {"products",
-         {72,    96,    120,   180,   210,   240,           360,   480,    720,
-          840,   1260,  1536,  2310,  2520,  3125,          4725,  5040,   6561,
-          10080, 13824, 16807, 27720, 30030, 65536 / 4 * 3, 75600, 177147, 360360},
-         false},
-        {"primes",
-         {53,  59,  67,  83,   97,   107,  127,  167,  193,  251,  257,
-          383, 509, 769, 1021, 1283, 2053, 4099, 5003, 8191, 10007},
-         false},
-        {"cold", {16, 64, 100, 256, 1000, 1024, 4096, 10000, 16384, 65536, 262144, 1048576}, true}};
+    return {small,
+            powers,
+            {"tens", "10^2 to 10^6", {100, 1000, 10000, 100000, 1000000}, false},
+            {"products",
+             "products of small primes",
+             {72,    96,    120,   180,   210,   240,           360,   480,    720,
+              840,   1260,  1536,  2310,  2520,  3125,          4725,  5040,   6561,
+              10080, 13824, 16807, 27720, 30030, 65536 / 4 * 3, 75600, 177147, 360360},
+             false},
+            {"primes",
+             "primes",
+             {53,  59,  67,  83,   97,   107,  127,  167,  193,  251,  257,
+              383, 509, 769, 1021, 1283, 2053, 4099, 5003, 8191, 10007},
+             false},
+            {"cold",
+             "out of cache",
+             {16, 64, 100, 256, 1000, 1024, 4096, 10000, 16384, 65536, 262144, 1048576},
+             true}};
 }
 
 void ReportPlans() {
     std::printf("-- plan\n");
     for (const int32_t n : {1024, 65536, 1000000, 10007}) {
-        const auto build = MedianTimes([n] { const PlanReference plan(n); });
-        const auto transform = MedianTimes(Ours(n, false, 1));
+        const auto build = LeastTimes([n] { const PlanReference plan(n); });
+        const auto transform = LeastTimes(Ours(n, false, 1));
         std::printf("%8d built in %.1f us: %.1f transforms\n", n, build[0] * 1e6,
                     build[0] / transform[0]);
     }
     const PlanReference held(1024);
-    const auto hit = MedianTimes([] { const PlanReference again(1024); });
+    const auto hit = LeastTimes([] { const PlanReference again(1024); });
     std::printf("cache hit, taken and given back: %.1f ns\n", hit[0] * 1e9);
 }
 
 } // namespace
 
 int main(int argc, char **argv) {
-    Totals all;
+#ifdef QX_PEER_FFTW3
+    fftw_set_timelimit(10); // for FFTW_MEASURE to plan the longest lengths
+#endif
+    Totals all("all lengths");
     const auto wanted = [&](const char *name) {
         for (int i = 1; i < argc; ++i)
             if (std::strcmp(argv[i], name) == 0)
@@ -191,10 +193,10 @@ int main(int argc, char **argv) {
     for (const Group &group : Groups()) {
         if (!wanted(group.name))
             continue;
-        Totals totals;
+        Totals totals(group.about);
         for (const int32_t n : group.lengths)
             Compare(n, group.cold, totals, all);
-        totals.print(group.name);
+        totals.summary();
     }
     if (wanted("plan"))
         ReportPlans();

@@ -25,7 +25,7 @@ namespace {
 
 using qx::bench::HostMemory;
 using qx::bench::Keep;
-using qx::bench::MedianTimes;
+using qx::bench::LeastTimes;
 using qx::bench::Ratios;
 
 // Multiplications and additions of registers alone, twelve sums at once.
@@ -57,13 +57,13 @@ void DirectAgainstTheMachine() {
             out(static_cast<std::size_t>(n + taps));
         const int64_t products = int64_t{n} * taps;
         const auto times =
-            MedianTimes([&] { qx::ConvolveReal(x.data(), n, y.data(), taps, 0, out.data()); },
-                        [&] {
-                            if (qx::lanesInUse == 4)
-                                MultiplyAndAddWide(products);
-                            else
-                                MultiplyAndAdd<16>(products);
-                        });
+            LeastTimes([&] { qx::ConvolveReal(x.data(), n, y.data(), taps, 0, out.data()); },
+                       [&] {
+                           if (qx::lanesInUse == 4)
+                               MultiplyAndAddWide(products);
+                           else
+                               MultiplyAndAdd<16>(products);
+                       });
         std::printf("direct convolution, %5d taps %8.2f ns an output, %5.2f of the machine's "
                     "products\n",
                     taps, times[0] / (n + taps) * 1e9, times[1] / times[0]);
@@ -81,12 +81,12 @@ void TransformsAgainstTheirTransforms() {
         const HostMemory a(static_cast<std::size_t>(L)), b(static_cast<std::size_t>(L));
         const qx::PlanReference plan(L);
         const auto times =
-            MedianTimes([&] { qx::ConvolveReal(x.data(), n, y.data(), n, 1, out.data()); },
-                        [&] {
-                            qx::FFTRealForward(plan.get(), a.data(), b.data(), 1, 1, L);
-                            qx::FFTRealForward(plan.get(), a.data(), b.data(), 1, 1, L);
-                            qx::FFTRealInverse(plan.get(), b.data(), a.data(), 1, 1, L);
-                        });
+            LeastTimes([&] { qx::ConvolveReal(x.data(), n, y.data(), n, 1, out.data()); },
+                       [&] {
+                           qx::FFTRealForward(plan.get(), a.data(), b.data(), 1, 1, L);
+                           qx::FFTRealForward(plan.get(), a.data(), b.data(), 1, 1, L);
+                           qx::FFTRealInverse(plan.get(), b.data(), a.data(), 1, 1, L);
+                       });
         std::printf("convolution by transforms, n %8d %10.3f us  over its transforms %5.2f\n", n,
                     times[0] * 1e6, times[0] / times[1]);
         ratios.add(times[0] / times[1], "n " + std::to_string(n));
@@ -107,13 +107,13 @@ void FIRAgainstLiquid(Ratios &ratios) {
 #ifdef QX_PEER_LIQUID
         std::vector<float> h(b.data(), b.data() + taps), in(x.data(), x.data() + samples), out(in);
         firfilt_rrrf filter = firfilt_rrrf_create(h.data(), static_cast<unsigned>(taps));
-        const auto times = MedianTimes(
+        const auto times = LeastTimes(
             ours, [&] { firfilt_rrrf_execute_block(filter, in.data(), samples, out.data()); });
         firfilt_rrrf_destroy(filter);
         ratios.add(times[0] / times[1], std::to_string(taps) + " taps");
         const double ratio = times[0] / times[1];
 #else
-        const auto times = MedianTimes(ours);
+        const auto times = LeastTimes(ours);
         const double ratio = 0;
 #endif
         std::printf("FIR filter, %4d taps %8.2f ns a sample, liquid-dsp (single) %s\n", taps,
@@ -152,13 +152,13 @@ void CascadeAgainstLiquid(Ratios &ratios) {
         std::vector<float> in(signal.data(), signal.data() + samples), out(in);
         iirfilt_rrrf filter = iirfilt_rrrf_create_sos(numerators.data(), denominators.data(),
                                                       static_cast<unsigned>(sections));
-        const auto times = MedianTimes(
+        const auto times = LeastTimes(
             ours, [&] { iirfilt_rrrf_execute_block(filter, in.data(), samples, out.data()); });
         iirfilt_rrrf_destroy(filter);
         ratios.add(times[0] / times[1], std::to_string(sections) + " sections");
         const double ratio = times[0] / times[1];
 #else
-        const auto times = MedianTimes(ours);
+        const auto times = LeastTimes(ours);
         const double ratio = 0;
 #endif
         std::printf("cascade, %2d sections %8.2f ns a sample, liquid-dsp (single) %s\n", sections,
@@ -187,7 +187,7 @@ void OneSample() {
     Block a(s.a), b(s.b), state(std::vector<double>(16));
     const uint8_t keeps = 0;
     double sample = 0.5;
-    const auto times = MedianTimes([&] {
+    const auto times = LeastTimes([&] {
         sample = 0.5;
         IIR_Filter_PtbyPt(&sample, 0, a.handle(), b.handle(), state.handle(), &keeps);
         Keep(sample);

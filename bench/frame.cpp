@@ -18,8 +18,8 @@
 namespace {
 
 using qx::bench::Keep;
+using qx::bench::LeastTimes;
 using qx::bench::Median;
-using qx::bench::MedianTimes;
 using qx::bench::Ratios;
 using qx::bench::SecondsOf;
 
@@ -95,7 +95,7 @@ void Compare(int threads, Ratios &all) {
 void CompareCalls() {
     constexpr int calls = 1000;
     static volatile int32_t length = 5;
-    const auto times = MedianTimes(
+    const auto times = LeastTimes(
         [] {
             for (int i = 0; i < calls; ++i)
                 Keep(qx::WholeOf(length));

@@ -27,7 +27,7 @@ namespace {
 using qx::ElementType;
 using qx::bench::HostMemory;
 using qx::bench::Keep;
-using qx::bench::MedianTimes;
+using qx::bench::LeastTimes;
 using qx::bench::Ratios;
 
 constexpr int32_t blockSize = 20000;
@@ -94,11 +94,11 @@ std::array<double, 2> AgainstLiquid(Filtering<ElementType::SGL> &ours, int32_t t
 
     h.resize(static_cast<std::size_t>(terms) * L);
     const auto resampler = rresamp_rrrf_create(L, M, static_cast<unsigned>(terms) / 2, h.data());
-    auto times = MedianTimes([&] { ours.polyphase(); },
-                             [&] {
-                                 rresamp_rrrf_execute_block(resampler, input, n / M, y.data());
-                                 Keep(y[0]);
-                             });
+    auto times = LeastTimes([&] { ours.polyphase(); },
+                            [&] {
+                                rresamp_rrrf_execute_block(resampler, input, n / M, y.data());
+                                Keep(y[0]);
+                            });
     rresamp_rrrf_destroy(resampler);
     const auto keepFastest = [&](const std::array<double, 2> &others) {
         times[0] = std::min(times[0], others[0]);
@@ -107,20 +107,20 @@ std::array<double, 2> AgainstLiquid(Filtering<ElementType::SGL> &ours, int32_t t
     if (M == 1) {
         const auto interpolator =
             firinterp_rrrf_create(L, h.data(), static_cast<unsigned>(ours.taps));
-        keepFastest(MedianTimes([&] { ours.polyphase(); },
-                                [&] {
-                                    firinterp_rrrf_execute_block(interpolator, input, n, y.data());
-                                    Keep(y[0]);
-                                }));
+        keepFastest(LeastTimes([&] { ours.polyphase(); },
+                               [&] {
+                                   firinterp_rrrf_execute_block(interpolator, input, n, y.data());
+                                   Keep(y[0]);
+                               }));
         firinterp_rrrf_destroy(interpolator);
     }
     if (L == 1) {
         const auto decimator = firdecim_rrrf_create(M, h.data(), static_cast<unsigned>(ours.taps));
-        keepFastest(MedianTimes([&] { ours.polyphase(); },
-                                [&] {
-                                    firdecim_rrrf_execute_block(decimator, input, n / M, y.data());
-                                    Keep(y[0]);
-                                }));
+        keepFastest(LeastTimes([&] { ours.polyphase(); },
+                               [&] {
+                                   firdecim_rrrf_execute_block(decimator, input, n / M, y.data());
+                                   Keep(y[0]);
+                               }));
         firdecim_rrrf_destroy(decimator);
     }
     return times;
@@ -135,15 +135,15 @@ std::array<double, 2> AgainstSamplerate(Filtering<ElementType::SGL> &ours) {
     SRC_STATE *state = src_new(SRC_SINC_FASTEST, 1, &error);
     SRC_DATA data{};
     data.src_ratio = static_cast<double>(ours.ratio.L) / ours.ratio.M;
-    const auto times = MedianTimes([&] { ours.polyphase(); },
-                                   [&] {
-                                       data.data_in = x.data();
-                                       data.input_frames = ours.n;
-                                       data.data_out = y.data();
-                                       data.output_frames = static_cast<long>(y.size());
-                                       src_process(state, &data);
-                                       Keep(y[0]);
-                                   });
+    const auto times = LeastTimes([&] { ours.polyphase(); },
+                                  [&] {
+                                      data.data_in = x.data();
+                                      data.input_frames = ours.n;
+                                      data.data_out = y.data();
+                                      data.output_frames = static_cast<long>(y.size());
+                                      src_process(state, &data);
+                                      Keep(y[0]);
+                                  });
     src_delete(state);
     return times;
 }
@@ -162,8 +162,8 @@ void Rates() {
             Filtering<ElementType::SGL> single(ratio, terms, blockSize);
             Filtering<ElementType::DBL> real(ratio, terms, blockSize);
             Filtering<ElementType::CDB> complex(ratio, terms, blockSize);
-            const auto times = MedianTimes([&] { single.polyphase(); }, [&] { real.polyphase(); },
-                                           [&] { complex.polyphase(); });
+            const auto times = LeastTimes([&] { single.polyphase(); }, [&] { real.polyphase(); },
+                                          [&] { complex.polyphase(); });
             const double perTap = times[1] / real.outputs / terms * 1e9;
             std::printf("%-18s double %6.3f ns a tap  single/double %5.2f  complex/real %5.2f",
                         name.c_str(), perTap, times[0] / times[1], times[2] / times[1]);
@@ -217,7 +217,7 @@ void Sums() {
             HostMemory rings(static_cast<std::size_t>((width + 1) * stages));
             qx::MovingSumState<ElementType::DBL> state{
                 rings.data(), width + 1, rings.data() + width, width + 1, stages, width, 0};
-            const auto times = MedianTimes(
+            const auto times = LeastTimes(
                 [&] {
                     std::memset(rings.data(), 0,
                                 8 * static_cast<std::size_t>((width + 1) * stages));

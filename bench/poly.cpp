@@ -20,7 +20,7 @@
 namespace {
 
 using qx::bench::Keep;
-using qx::bench::MedianTimes;
+using qx::bench::LeastTimes;
 using qx::bench::Ratios;
 
 std::vector<double> FromRoots(const std::vector<double> &roots) {
@@ -67,7 +67,7 @@ double PeerSeconds([[maybe_unused]] const std::vector<double> &a) {
     gsl_set_error_handler_off();
     gsl_poly_complex_workspace *const work = gsl_poly_complex_workspace_alloc(a.size());
     std::vector<double> roots(2 * a.size());
-    const auto times = MedianTimes([&] {
+    const auto times = LeastTimes([&] {
         gsl_poly_complex_solve(a.data(), a.size(), work, roots.data());
         Keep(roots[0]);
     });
@@ -93,7 +93,7 @@ int main() {
                 coefficients.push_back({value, 0.0});
             std::vector<int32_t> times(a.size());
             int32_t count = 0, otherCount = 0;
-            const auto seconds = MedianTimes(
+            const auto seconds = LeastTimes(
                 [&] {
                     qx::CxPolynomialRoots(coefficients.data(), n, 100, roots.data(), &count);
                     Keep(roots[0]);

@@ -15,7 +15,7 @@
 namespace {
 
 using qx::bench::Keep;
-using qx::bench::MedianTimes;
+using qx::bench::LeastTimes;
 using qx::bench::Ratios;
 
 constexpr int32_t n = 10000;
@@ -43,7 +43,7 @@ void AdditionChain(double step) {
 
 template <class Work, class Peer>
 void Row(Ratios &ratios, const char *name, const Work &work, const Peer &peer) {
-    const auto [ours, theirs] = MedianTimes(work, peer);
+    const auto [ours, theirs] = LeastTimes(work, peer);
     std::printf("%-18s %7.2f ns a sample  ratio %5.2f\n", name, ours / n * 1e9, ours / theirs);
     ratios.add(ours / theirs, name);
 }

@@ -13,7 +13,7 @@ namespace {
 
 using qx::bench::HostMemory;
 using qx::bench::Keep;
-using qx::bench::MedianTimes;
+using qx::bench::LeastTimes;
 using qx::bench::Ratios;
 
 // The spectrum works in place, so each call gets the signal anew, at the same cost on both sides;
@@ -28,7 +28,7 @@ void Compare(int32_t n, Ratios &ratios) {
         std::memcpy(in.data(), signal.data(), sizeof(double) * n);
         Keep(in);
     };
-    const auto times = MedianTimes(
+    const auto times = LeastTimes(
         [&] {
             refill();
             qx::PowerSpectrumReal(in.data(), n);

@@ -12,7 +12,8 @@ HEAD = """# Speed
 
 Written by `bench/run --all`. Each row is a geometric mean of the ratios time of ours / time of the
 peer, one thread, plans and the like made outside the timed loop; below 1 is faster than the peer.
-Medians of interleaved runs; on a machine with a load of its own (below) single worst cases say little.
+The shortest of interleaved runs; on a machine with a load of its own (below) single worst cases say
+little.
 """
 
 
@@ -30,12 +31,14 @@ def machine():
 
 
 def main():
-    family, rows, builds, absent = None, [], set(), []
+    family, rows, builds, absent, stopped = None, [], set(), [], []
     for line in Path(sys.argv[1]).read_text().splitlines():
         if line.startswith("== "):
             family = line[3:]
         elif line.startswith("missing peer: "):
             absent.append(f"- `{family}`: {line.removeprefix('missing peer: ')}")
+        elif line.startswith("stopped: "):
+            stopped.append(f"- `{family}`, {line.removeprefix('stopped: ')}")
         elif line.startswith("summary | "):
             what, peer, mean, worst, case, count, width, compiler = [
                 cell.strip() for cell in line.split(" |")[1:]]
@@ -47,6 +50,9 @@ def main():
         print(f"Width {width}, {compiler}.\n")
     print("| Family | What | Peer | Mean | Worst | At | Cases |\n|---|---|---|---|---|---|---|")
     print("\n".join(rows))
+    if stopped:
+        print("\nStopped before their end, so that groups of cases are missing:\n")
+        print("\n".join(stopped))
     if absent:
         print("\nPeers that were not installed:\n")
         print("\n".join(absent))

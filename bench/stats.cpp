@@ -15,7 +15,7 @@
 namespace {
 
 using qx::bench::Keep;
-using qx::bench::MedianTimes;
+using qx::bench::LeastTimes;
 using qx::bench::Ratios;
 
 // Different arrays of one kind and length, taken in turn, so that the branch predictor does not
@@ -75,8 +75,8 @@ void CompareOnAllKinds(const char *name, const char *peerName, const Ours &ours,
             int ourTurn = 0;
             int peerTurn = 0;
             const auto [ourTime, peerTime] =
-                MedianTimes([&] { ours(pool.next(ourTurn), n, work.data()); },
-                            [&] { peer(pool.next(peerTurn), n, work.data()); });
+                LeastTimes([&] { ours(pool.next(ourTurn), n, work.data()); },
+                           [&] { peer(pool.next(peerTurn), n, work.data()); });
             std::printf("%-8s %-18s n %9d %12.3f us  ratio %5.2f\n", name, kind.name, n,
                         ourTime * 1e6, ourTime / peerTime);
             std::fflush(stdout);
@@ -147,19 +147,19 @@ void Sums() {
         int otherTurn = 0;
         double result;
         const auto times =
-            MedianTimes([&] { AdditionChain(n, 1.25); },
-                        [&] {
-                            qx::ArrayMean(x.next(turn), n, &result);
-                            Keep(result);
-                        },
-                        [&] {
-                            qx::ArrayRMS(x.next(turn), n, &result);
-                            Keep(result);
-                        },
-                        [&] {
-                            qx::ArrayMSE(x.next(turn), n, y.next(otherTurn), n, &result);
-                            Keep(result);
-                        });
+            LeastTimes([&] { AdditionChain(n, 1.25); },
+                       [&] {
+                           qx::ArrayMean(x.next(turn), n, &result);
+                           Keep(result);
+                       },
+                       [&] {
+                           qx::ArrayRMS(x.next(turn), n, &result);
+                           Keep(result);
+                       },
+                       [&] {
+                           qx::ArrayMSE(x.next(turn), n, y.next(otherTurn), n, &result);
+                           Keep(result);
+                       });
         std::printf("sums n %9d  limit %6.3f ns a term; ratios: mean %5.3f  RMS %5.3f  MSE %5.3f\n",
                     n, times[0] / n * 1e9, times[1] / times[0], times[2] / times[0],
                     times[3] / times[0]);

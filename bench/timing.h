@@ -9,13 +9,15 @@
 #include <cmath>
 #include <cstddef>
 #include <cstdio>
+#include <limits>
 #include <string>
 #include <vector>
 
 // What every benchmark uses.
 //
-// MedianTimes times contestants as medians of interleaved runs: each runs once in each round, so
-// that what disturbs the machine disturbs all of them alike.
+// LeastTimes times contestants by their shortest of interleaved runs: each runs once in each round,
+// so that what disturbs the machine disturbs all of them alike, and what is left out are
+// disturbances.
 //
 // Ratios collects ours/peer over the cases of a group, each with its name:
 //
@@ -56,23 +58,26 @@ std::size_t RepeatsFor(double seconds, const Work &work) {
 
 // The seconds that one call of each contestant takes.
 template <class... Work>
-std::array<double, sizeof...(Work)> MedianTimes(const Work &...contestants) {
+std::array<double, sizeof...(Work)> LeastTimes(const Work &...contestants) {
     constexpr double runSeconds = 1e-4;
     constexpr int rounds = 25;
     constexpr double longEnough = 1.0; // long work is content with three rounds
     const std::array<std::size_t, sizeof...(Work)> repeats = {
         RepeatsFor(runSeconds, contestants)...};
-    std::array<std::vector<double>, sizeof...(Work)> times;
+    std::array<double, sizeof...(Work)> least;
+    least.fill(std::numeric_limits<double>::infinity());
     double taken = 0;
     for (int round = 0; round < rounds && (round < 3 || taken < longEnough); ++round) {
         std::size_t i = 0;
-        ((times[i].push_back(SecondsOf(repeats[i], contestants) / repeats[i]),
-          taken += times[i].back() * static_cast<double>(repeats[i]), ++i),
-         ...);
+        const auto run = [&](const auto &work) {
+            const double seconds = SecondsOf(repeats[i], work);
+            taken += seconds;
+            least[i] = std::min(least[i], seconds / static_cast<double>(repeats[i]));
+            ++i;
+        };
+        (run(contestants), ...);
     }
-    std::array<double, sizeof...(Work)> medians;
-    std::transform(times.begin(), times.end(), medians.begin(), Median);
-    return medians;
+    return least;
 }
 
 inline const char *WidthInUse() { return lanesInUse == 4 ? "AVX2" : "SSE2"; }

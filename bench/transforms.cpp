@@ -17,7 +17,7 @@ namespace {
 
 using qx::bench::FFTWPlan;
 using qx::bench::HostMemory;
-using qx::bench::MedianTimes;
+using qx::bench::LeastTimes;
 using qx::bench::Ratios;
 
 #ifdef QX_PEER_FFTW3
@@ -48,8 +48,8 @@ void Compare(int32_t n, [[maybe_unused]] Totals &totals) {
     const FFTWPlan estimate = Peer(n, FFTW_REDFT10, FFTW_ESTIMATE);
     const FFTWPlan measure = Peer(n, FFTW_REDFT10, FFTW_MEASURE);
     const FFTWPlan inverseMeasure = Peer(n, FFTW_REDFT01, FFTW_MEASURE);
-    const auto times = MedianTimes(forward, estimate, measure);
-    const auto inverseTimes = MedianTimes(inverse, inverseMeasure);
+    const auto times = LeastTimes(forward, estimate, measure);
+    const auto inverseTimes = LeastTimes(inverse, inverseMeasure);
     const std::string name = std::to_string(n);
     totals.forwardEstimate.add(times[0] / times[1], name);
     totals.forwardMeasure.add(times[0] / times[2], name);
@@ -58,7 +58,7 @@ void Compare(int32_t n, [[maybe_unused]] Totals &totals) {
                 times[0] / times[1], times[0] / times[2], inverseTimes[0] * 1e6,
                 inverseTimes[0] / inverseTimes[1]);
 #else
-    const auto times = MedianTimes(forward, inverse);
+    const auto times = LeastTimes(forward, inverse);
     std::printf("%8d DCT %10.3f us   inverse %10.3f us\n", n, times[0] * 1e6, times[1] * 1e6);
 #endif
     std::fflush(stdout);

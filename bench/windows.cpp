@@ -40,7 +40,7 @@ int main() {
         for (const int32_t n : {1000, 10000, 100000, 1000000}) {
             std::vector<double> x(static_cast<std::size_t>(n), 1.0);
             const qx::CosineCoefficients &coefs = qx::CosineWindowCoefs(window.selector);
-            const auto [ours, plain] = qx::bench::MedianTimes(
+            const auto [ours, plain] = qx::bench::LeastTimes(
                 [&] {
                     qx::ApplyCosineWindowBySelector(qx::RealSignal(x.data()), n, window.selector,
                                                     0);
