@@ -20,7 +20,7 @@ namespace {
 
 using qx::bench::HostMemory;
 using qx::bench::Keep;
-using qx::bench::MedianTimes;
+using qx::bench::LeastTimes;
 using qx::bench::Ratios;
 
 void Fill(DBL *x, int32_t n, double (*value)(int32_t i)) {
@@ -59,7 +59,7 @@ void Scans() {
             state.width = w;
             qx::PointInto(buffer.data(), w, &state);
             const qx::PeakBlock block{x.data(), n, 0.5, true, true, false, false};
-            const auto [ours, plain] = MedianTimes(
+            const auto [ours, plain] = LeastTimes(
                 [&] {
                     qx::PeakList found = qx::ListFor(block, state);
                     qx::PeakDetectStep(block, &state, &found);
@@ -119,7 +119,7 @@ void Crossings() {
         for (const int32_t every : {20, 300, 10000}) {
             for (int32_t i = 0; i < n; ++i)
                 y.data()[i] = std::sin(std::numbers::pi * (i + 0.5) / every) + 1e-3 * Noise(i);
-            const auto [ours, plain, reading] = MedianTimes(
+            const auto [ours, plain, reading] = LeastTimes(
                 [&] { Keep(qx::FindMidCrossings(0, y.data(), n, 0, 0.5, list.data(), n)); },
                 [&] { Keep(PlainCrossings(y.data(), n, 0, 0.5, list.data(), n)); },
                 [&] { Keep(SumInVectors(y.data(), n)); });
