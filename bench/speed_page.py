@@ -1,5 +1,5 @@
 #!/usr/bin/python3
-"""speed_page.py LOG: the page docs/speed.md from what all benchmarks have printed."""
+"""speed_page.py LOG...: the page docs/speed.md from what the benchmarks have printed."""
 
 import datetime
 import os
@@ -32,7 +32,7 @@ def machine():
 
 def main():
     family, rows, builds, absent, stopped = None, [], set(), [], []
-    for line in Path(sys.argv[1]).read_text().splitlines():
+    for line in (line for log in sys.argv[1:] for line in Path(log).read_text().splitlines()):
         if line.startswith("== "):
             family = line[3:]
         elif line.startswith("missing peer: "):
