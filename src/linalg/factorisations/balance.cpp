@@ -77,9 +77,10 @@ private:
                 row += AbsSum(at(i)[j]);
             }
         const double sum = column + row;
-        // A sum that overflows would never meet its bound.
-        if (column == 0.0 || row == 0.0 || !std::isfinite(sum))
+        // A sum whose double overflows would never meet its bound.
+        if (column == 0.0 || row == 0.0 || !(sum < 1.0 / least))
             return false;
+        const double before = column;
         double factor = 1.0;
         for (const double bound = row * 0.5; column < bound; column *= 4.0)
             factor *= 2.0;
@@ -87,7 +88,13 @@ private:
             factor *= 0.5;
         if (!((column + row) / factor < sum * 0.95))
             return false;
-        scale_[i] *= factor;
+        // Below `least` elements lose digits by the scaling, and what comes out smaller by rounding
+        // alone may come out smaller again and again.
+        const double scale = scale_[i] * factor;
+        if (before * factor < least || row / factor < least || !(scale > least) ||
+            !(scale < 1.0 / least))
+            return false;
+        scale_[i] = scale;
         const double inverse = 1.0 / factor;
         for (int32_t j = low_; j < n_; ++j)
             at(i)[j] = at(i)[j] * inverse;
@@ -95,6 +102,8 @@ private:
             at(j)[i] = at(j)[i] * factor;
         return true;
     }
+
+    static constexpr double least = 0x1p-970;
 
     T *a_;
     std::ptrdiff_t stride_;

@@ -476,6 +476,28 @@ TEST(Balancing, ChecksItsRangeAndEndsOnHugeElements) {
     }
 }
 
+// Sums whose multiples overflow, and elements that are rounded when they are scaled.
+TEST(Balancing, EndsAtBothEndsOfTheExponents) {
+    DBLArray scale;
+    int32_t low, high;
+    const DBL2DArray huge(2, 2, {1.0, 1e308, 0.46e308, 1.0});
+    EXPECT_EQ(MatrixBalance_head(huge.handle(), 2, &low, &high, scale.handle()), 0);
+    EXPECT_EQ(huge[1], 1e308);
+    for (int n = 2; n <= 40; ++n) {
+        std::vector<double> elements = RealMatrix(MatrixKinds()[0], n, n);
+        for (std::size_t i = 0; i < elements.size(); ++i)
+            elements[i] = std::ldexp(elements[i], i % 3 == 0 ? -1060 : i % 7 == 0 ? 900 : -1020);
+        const DBL2DArray a(n, n, elements);
+        EXPECT_EQ(MatrixBalance_head(a.handle(), 2, &low, &high, scale.handle()), 0);
+        for (int i = 0; i < n; ++i) {
+            int exponent;
+            EXPECT_EQ(std::frexp(scale[i], &exponent), 0.5) << "a power of two";
+        }
+        for (const double x : a.values())
+            EXPECT_TRUE(std::isfinite(x));
+    }
+}
+
 TEST(Factorisations, RefuseWhatIsNotFinite) {
     for (const double bad : {nan, inf, -inf, 1.7976931348623157e308}) {
         const std::vector<double> a = {1.0, bad, 2.0, 3.0};
