@@ -9,7 +9,6 @@
 #include "stats/histogram.h"
 #include "stats/order.h"
 
-#include <algorithm>
 #include <cmath>
 
 namespace qx {
@@ -45,7 +44,7 @@ struct Levels {
 
 ErrorCode FindLevels(const FitSamples &samples, Levels *found) {
     DBL max, min;
-    I32 maxIndex, minIndex;
+    int32_t maxIndex, minIndex;
     if (const ErrorCode failed =
             ArrayMaxMin(samples.y, samples.n, &max, &maxIndex, &min, &minIndex))
         return failed;
@@ -105,7 +104,8 @@ struct Candidate {
         if (status == ErrOutOfMemory)
             return status;
         // The sum of a mean square may come out just below 0.
-        mse = status < 0 || !std::isfinite(mse) ? -1.0 : std::max(0.0, +mse);
+        const bool isUsable = status >= 0 && std::isfinite(mse);
+        mse = !isUsable ? -1.0 : mse < 0.0 ? 0.0 : mse;
         return 0;
     }
 };
