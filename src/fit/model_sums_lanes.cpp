@@ -41,22 +41,16 @@ QX_INLINE L ExpWithin(L t) {
     const L shifted = t * L(0x1.71547652b82fep+0) + shift;
     const L k = shifted - shift;
     const L r = (t - k * L(0x1.62e42feep-1)) - k * L(0x1.a39ef35793c76p-33);
-    constexpr double coefficients[] = {0x1.6124613a86d09p-33, // 1 / 13!
-                                       0x1.1eed8eff8d898p-29,
-                                       0x1.ae64567f544e4p-26,
-                                       0x1.27e4fb7789f5cp-22,
-                                       0x1.71de3a556c734p-19,
-                                       0x1.a01a01a01a01ap-16,
-                                       0x1.a01a01a01a01ap-13,
-                                       0x1.6c16c16c16c17p-10,
-                                       0x1.1111111111111p-7,
-                                       0x1.5555555555555p-5,
-                                       0x1.5555555555555p-3,
-                                       0.5};
-    L series(coefficients[0]);
-    for (std::size_t i = 1; i < sizeof coefficients / sizeof *coefficients; ++i)
-        series = series * r + L(coefficients[i]);
-    return ((r * r) * series + r + L(1.0)) * PowerOfTwo(shifted);
+    const L r2 = r * r, r4 = r2 * r2;
+    // 1 / 2!, 1 / 3!, ... 1 / 13!, in pairs, so that few operations wait for each other.
+    const L p2 = L(0.5) + L(0x1.5555555555555p-3) * r;
+    const L p4 = L(0x1.5555555555555p-5) + L(0x1.1111111111111p-7) * r;
+    const L p6 = L(0x1.6c16c16c16c17p-10) + L(0x1.a01a01a01a01ap-13) * r;
+    const L p8 = L(0x1.a01a01a01a01ap-16) + L(0x1.71de3a556c734p-19) * r;
+    const L p10 = L(0x1.27e4fb7789f5cp-22) + L(0x1.ae64567f544e4p-26) * r;
+    const L p12 = L(0x1.1eed8eff8d898p-29) + L(0x1.6124613a86d09p-33) * r;
+    const L series = (p2 + p4 * r2) + ((p6 + p8 * r2) + (p10 + p12 * r2) * r4) * r4;
+    return (r2 * series + r + L(1.0)) * PowerOfTwo(shifted);
 }
 
 template <class L>
