@@ -69,6 +69,22 @@ private:
             Swap(&at(j)[i], &at(m)[i]);
     }
 
+    // Below `least` elements lose digits by the scaling, and what comes out smaller by rounding
+    // alone may come out smaller again and again.
+    static bool isFair(double x) { return x > least && x < 1.0 / least; }
+
+    // Whether an element that belongs to no sum, for it stands beside the block, would be too
+    // large.
+    bool overflowsBesides(int32_t i, double factor, double inverse) const {
+        for (int32_t j = high_ + 1; j < n_; ++j)
+            if (AbsSum(at(i)[j]) * inverse >= 1.0 / least)
+                return true;
+        for (int32_t j = 0; j < low_; ++j)
+            if (AbsSum(at(j)[i]) * factor >= 1.0 / least)
+                return true;
+        return false;
+    }
+
     bool scaleOne(int32_t i) {
         double column = 0.0, row = 0.0;
         for (int32_t j = low_; j <= high_; ++j)
@@ -88,18 +104,17 @@ private:
             factor *= 0.5;
         if (!((column + row) / factor < sum * 0.95))
             return false;
-        // Below `least` elements lose digits by the scaling, and what comes out smaller by rounding
-        // alone may come out smaller again and again.
-        const double scale = scale_[i] * factor;
-        if (before * factor < least || row / factor < least || !(scale > least) ||
-            !(scale < 1.0 / least))
+        const double inverse = 1.0 / factor, scale = scale_[i] * factor;
+        if (!isFair(factor) || !isFair(scale) || !isFair(before * factor) ||
+            !isFair(row * inverse) || overflowsBesides(i, factor, inverse))
             return false;
         scale_[i] = scale;
-        const double inverse = 1.0 / factor;
         for (int32_t j = low_; j < n_; ++j)
-            at(i)[j] = at(i)[j] * inverse;
+            if (j != i)
+                at(i)[j] = at(i)[j] * inverse;
         for (int32_t j = 0; j <= high_; ++j)
-            at(j)[i] = at(j)[i] * factor;
+            if (j != i)
+                at(j)[i] = at(j)[i] * factor;
         return true;
     }
 
