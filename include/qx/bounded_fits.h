@@ -61,8 +61,8 @@ QX_API ErrorCode BoundLinearFitBi_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DB
 /** y = a exp(b x) + c within bounds, by Levenberg-Marquardt steps: at most 20 of them, and at most
     half of all, by least squares without bounds, then the rest within the bounds by the method. A
     step counts that lowers the cost; when that is by less than tolerance times the cost, the fit
-    ends. It finds the minimum nearest to its start, with about half the digits of the data where
-   the tolerance is 1e-12. D. W. Marquardt, "An algorithm for least-squares estimation of nonlinear
+    ends. It ends in the minimum that its start leads to, with some 8 digits of
+    the coefficients where the tolerance is 1e-14. D. W. Marquardt, "An algorithm for least-squares estimation of nonlinear
     parameters", 1963. Codes: ErrSizeMismatch (x or w does not fit y), ErrSizesDisagree (lower or
     upper are too short, or they differ in length), ErrNaNInData (a bound is NaN, or the residuals
    at the start are), ErrFitPointsTooFew (fewer samples than free coefficients), ErrOutOfMemory (no
