@@ -23,35 +23,35 @@
 QX_BEGIN_DECLS
 
 /** The line y = a x + b within bounds by least squares. A plain line that lies within them is the
-    answer; else a barrier method and the closed forms on the edges of the bounds find the best one.
-    Equal x give NaN or infinities. Codes: ErrSizeMismatch (x or w does not fit y), ErrSizesDisagree
-    (lower or upper have one element, or they differ in length), ErrNaNInData (a bound is NaN),
-    ErrFitPointsTooFew (fewer samples than free coefficients), ErrNonFiniteInput (a weight is NaN or
-    infinite), ErrTooFewWeights (only one weight is not 0), ErrBoundsCrossed (a lower bound is above
-    its upper one), ErrOutOfMemory (no memory where an input is y). */
+    answer; else a barrier method and the closed forms on the edges of the bounds find the best
+    one. Equal x give NaN or infinities. Codes: ErrSizeMismatch (x or w does not fit y),
+    ErrSizesDisagree (lower or upper have one element, or they differ in length), ErrNaNInData (a
+    bound is NaN), ErrFitPointsTooFew (fewer samples than free coefficients), ErrNonFiniteInput (a
+    weight is NaN or infinite), ErrTooFewWeights (only one weight is not 0), ErrBoundsCrossed (a
+    lower bound is above its upper one), ErrOutOfMemory (no memory where an input is y). */
 QX_API ErrorCode BoundLinearFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w,
                                      QX_IN DBL1D lower, QX_IN DBL1D upper, QX_OUT double *a,
                                      QX_OUT double *b, QX_OUT double *mse);
 
-/** As BoundLinearFit_head, by least absolute residuals: lines of least squares with the weights
-    1 / |r| of the line before, where |r| counts as no less than a hundredth of the median of all,
+/** As BoundLinearFit_head, by least absolute residuals: lines of least squares with the weights 1
+    / |r| of the line before, where |r| counts as no less than a hundredth of the median of all,
     until the line moves by no more than tolerance times the residuals. The best of them counts. So
-    the sum is about that much above the least one. E. J. Schlossmacher, "An iterative technique for
-    absolute deviations curve fitting", 1973.
-    A bound array of bad length is left out, with the warning. Codes: ErrSizeMismatch (x or w does
-    not fit y), ErrNaNInData (a bound or a residual is NaN), ErrFitPointsTooFew (fewer samples than
-    free coefficients), ErrNonFiniteInput (a weight is NaN or infinite), ErrTooFewWeights (only one
-    weight is not 0), ErrBoundsCrossed (a lower bound is above its upper one), ErrOutOfMemory (no
-    memory), ErrIterationLimit (the limit is reached, or lines come back without rest; all outputs
-   are valid), WarnFitIncomplete (lower or upper have one element, or they differ in length). */
+    the sum is about that much above the least one. E. J. Schlossmacher, "An iterative technique
+    for absolute deviations curve fitting", 1973. A bound array of bad length is left out, with the
+    warning. Codes: ErrSizeMismatch (x or w does not fit y), ErrNaNInData (a bound or a residual is
+    NaN), ErrFitPointsTooFew (fewer samples than free coefficients), ErrNonFiniteInput (a weight is
+    NaN or infinite), ErrTooFewWeights (only one weight is not 0), ErrBoundsCrossed (a lower bound
+    is above its upper one), ErrOutOfMemory (no memory), ErrIterationLimit (the limit is reached,
+    or lines come back without rest; all outputs are valid), WarnFitIncomplete (lower or upper have
+    one element, or they differ in length). */
 QX_API ErrorCode BoundLinearFitLAR_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w,
                                         double tolerance, QX_INOUT int32_t *iterations,
                                         QX_IN DBL1D lower, QX_IN DBL1D upper, QX_OUT double *a,
                                         QX_OUT double *b, QX_OUT double *meanAbsResidual);
 
 /** As BoundLinearFitLAR_head, by bisquare weights: (1 - u^2)^2 for |u| < 1 and 0 beyond, u being
-   the residual, divided by sqrt(1 - leverage), by 4.685 and by the median distance of all from
-   their median over 0.6745. P. W. Holland and R. E. Welsch, "Robust regression using iteratively
+    the residual, divided by sqrt(1 - leverage), by 4.685 and by the median distance of all from
+    their median over 0.6745. P. W. Holland and R. E. Welsch, "Robust regression using iteratively
     reweighted least-squares", 1977. */
 QX_API ErrorCode BoundLinearFitBi_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w,
                                        double tolerance, QX_INOUT int32_t *iterations,
@@ -61,17 +61,18 @@ QX_API ErrorCode BoundLinearFitBi_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DB
 /** y = a exp(b x) + c within bounds, by Levenberg-Marquardt steps: at most 20 of them, and at most
     half of all, by least squares without bounds, then the rest within the bounds by the method. A
     step counts that lowers the cost; when that is by less than tolerance times the cost, the fit
-    ends. It ends in the minimum that its start leads to, with some 8 digits of
-    the coefficients where the tolerance is 1e-14. D. W. Marquardt, "An algorithm for least-squares estimation of nonlinear
-    parameters", 1963. Codes: ErrSizeMismatch (x or w does not fit y), ErrSizesDisagree (lower or
-    upper are too short, or they differ in length), ErrNaNInData (a bound is NaN, or the residuals
-   at the start are), ErrFitPointsTooFew (fewer samples than free coefficients), ErrOutOfMemory (no
-    memory), ErrInvalidSelector (method is above 2), ErrNonFiniteInput (a weight or a sample is NaN
-    or infinite, or the cost is at the start and at the next point), ErrTooFewWeights (fewer weights
-    other than 0 than coefficients), ErrPolynomialOrderTooHigh (fewer than two values lie on one
-   side of the estimated c, so that there is no start), ErrIterationLimit (the singular values of
-   the start do not converge), ErrBoundsCrossed (a lower bound is above its upper one),
-    ErrSingularMatrix (a step is not determined), WarnFitIncomplete (guess is too short). */
+    ends. It ends in the minimum that its start leads to, with some 8 digits of the coefficients
+    where the tolerance is 1e-14. D. W. Marquardt, "An algorithm for least-squares estimation of
+    nonlinear parameters", 1963. Codes: ErrSizeMismatch (x or w does not fit y), ErrSizesDisagree
+    (lower or upper are too short, or they differ in length), ErrNaNInData (a bound is NaN, or the
+    residuals at the start are), ErrFitPointsTooFew (fewer samples than free coefficients),
+    ErrOutOfMemory (no memory), ErrInvalidSelector (method is above 2), ErrNonFiniteInput (a weight
+    or a sample is NaN or infinite, or the cost is at the start and at the next point),
+    ErrTooFewWeights (fewer weights other than 0 than coefficients), ErrPolynomialOrderTooHigh
+    (fewer than two values lie on one side of the estimated c, so that there is no start),
+    ErrIterationLimit (the singular values of the start do not converge), ErrBoundsCrossed (a lower
+    bound is above its upper one), ErrSingularMatrix (a step is not determined), WarnFitIncomplete
+    (guess is too short). */
 QX_API ErrorCode BoundExpFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, double tolerance,
                                   QX_INOUT int32_t *iterations, QX_IN DBL1D guess,
                                   QX_IN DBL1D lower, QX_IN DBL1D upper, uint16_t method,
@@ -81,13 +82,13 @@ QX_API ErrorCode BoundExpFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w
 /** As BoundExpFit_head, for y = a x^b + c with x above 0, with at most 30 steps without bounds. By
     least squares all steps are made without bounds first; where a bound cuts off the answer, up to
     as many follow within the bounds. Codes: ErrSizeMismatch (x or w does not fit y),
-    ErrSizesDisagree (lower or upper are too short, or they differ in length), ErrNaNInData (a bound
-    is NaN, or the residuals at the start are), ErrFitPointsTooFew (fewer samples than free
+    ErrSizesDisagree (lower or upper are too short, or they differ in length), ErrNaNInData (a
+    bound is NaN, or the residuals at the start are), ErrFitPointsTooFew (fewer samples than free
     coefficients), ErrOutOfMemory (no memory), ErrInvalidSelector (method is above 2),
     ErrNonFiniteInput (a weight or a sample is NaN or infinite, or the cost is at the start and at
     the next point), ErrTooFewWeights (fewer weights other than 0 than coefficients),
     ErrNotStrictlyPositive (an x is 0 or below), ErrPolynomialOrderTooHigh (fewer than two values
-   lie on one side of the estimated c, so that there is no start), ErrIterationLimit (the singular
+    lie on one side of the estimated c, so that there is no start), ErrIterationLimit (the singular
     values of the start do not converge), ErrBoundsCrossed (a lower bound is above its upper one),
     ErrSingularMatrix (a step is not determined), WarnFitIncomplete (guess is too short). */
 QX_API ErrorCode BoundPowerFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w,
@@ -115,12 +116,12 @@ QX_API ErrorCode BoundLogFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w
 
 /** As BoundExpFit_head, for the peak or dip y = a exp(-0.5 ((x - m) / s)^2) + c; s comes back
     without its sign. Bounds of bad length are left out without a word, and so is a guess that does
-    not begin with a finite value. Without a guess the fit starts at the peak on the lowest level of
-    the data or at the dip in the highest. Codes: ErrSizeMismatch (x or w does not fit y),
+    not begin with a finite value. Without a guess the fit starts at the peak on the lowest level
+    of the data or at the dip in the highest. Codes: ErrSizeMismatch (x or w does not fit y),
     ErrNaNInData (a bound is NaN, or the residuals at the start are), ErrFitPointsTooFew (fewer
-    samples than free coefficients), ErrOutOfMemory (no memory), ErrInvalidSelector (method is above
-    2), ErrNonFiniteInput (a weight or a sample is NaN or infinite, or the cost is at the start and
-    at the next point), ErrTooFewWeights (fewer weights other than 0 than coefficients),
+    samples than free coefficients), ErrOutOfMemory (no memory), ErrInvalidSelector (method is
+    above 2), ErrNonFiniteInput (a weight or a sample is NaN or infinite, or the cost is at the
+    start and at the next point), ErrTooFewWeights (fewer weights other than 0 than coefficients),
     ErrNoUsableFit (neither a peak nor a dip to start from), ErrFitStartValues (s starts at 0),
     ErrBoundsCrossed (a lower bound is above its upper one), ErrSingularMatrix (a step is not
     determined), WarnFitIncomplete (guess is too short). */
