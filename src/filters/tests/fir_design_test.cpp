@@ -214,6 +214,29 @@ TEST(Parks, IsCountedAndLimited) {
     EXPECT_NEAR(crowded.ripple, 0.5, 0.1); // of a step that no band leaves out
 }
 
+// Two heaps of points: products far below the smallest double on one, and far above the greatest on
+// the way to the other.
+TEST(Parks, MultipliesDistancesBeyondTheRangeOfADouble) {
+    constexpr int32_t n = 2041;
+    Signal x, product(n);
+    std::vector<int32_t> exponent(n);
+    for (int j = 0; j < n; ++j)
+        x.push_back((j < n * 3 / 5 ? 1 : -1) * (1 - 1e-6 * j));
+    qx::MultiplyDistances({x.data(), n, product.data(), exponent.data()});
+    for (std::size_t j = 0; j < x.size(); j += 37) {
+        long double logarithm = 0, sign = 1;
+        for (std::size_t k = 0; k < x.size(); ++k)
+            if (k != j) {
+                const long double distance = static_cast<long double>(x[j]) - x[k];
+                logarithm += std::log2(std::fabs(distance));
+                sign *= distance < 0 ? -1 : 1;
+            }
+        ASSERT_NEAR(std::log2(std::fabs(product[j])) + exponent[j], static_cast<double>(logarithm),
+                    1e-6);
+        ASSERT_EQ(std::signbit(product[j]), sign < 0);
+    }
+}
+
 TEST(Parks, TellsWhatCannotBeInOrder) {
     ResetHost();
     const RemezBand pass = {1, 0, 0.2, 1}, stop = {0, 0.3, 0.5, 1};
