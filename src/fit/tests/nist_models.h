@@ -6,6 +6,7 @@
 #include <cmath>
 #include <fstream>
 #include <map>
+#include <numbers>
 #include <sstream>
 #include <stdexcept>
 #include <string>
@@ -78,7 +79,7 @@ inline double Cubics(double x, const double *b) {
     return (b[0] + x * (b[1] + x * (b[2] + x * b[3]))) / (1 + x * (b[4] + x * (b[5] + x * b[6])));
 }
 inline double Wave(double x, double period, double cosine, double sine) {
-    const double phase = 2 * M_PI * x / period;
+    const double phase = 2 * std::numbers::pi * x / period;
     return cosine * std::cos(phase) + sine * std::sin(phase);
 }
 
@@ -153,7 +154,7 @@ inline const std::map<std::string, NistValue> &NistValues() {
          }},
         {"Roszman1",
          [](double x, double, const double *b) {
-             return b[0] - b[1] * x - std::atan(b[2] / (x - b[3])) / M_PI;
+             return b[0] - b[1] * x - std::atan(b[2] / (x - b[3])) / std::numbers::pi;
          }},
         {"Thurber", cubics},
     };
