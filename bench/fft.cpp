@@ -179,9 +179,6 @@ void ReportPlans() {
 } // namespace
 
 int main(int argc, char **argv) {
-#ifdef QX_PEER_FFTW3
-    fftw_set_timelimit(10); // for FFTW_MEASURE to plan the longest lengths
-#endif
     Totals all("all lengths");
     const auto wanted = [&](const char *name) {
         for (int i = 1; i < argc; ++i)

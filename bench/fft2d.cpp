@@ -53,9 +53,6 @@ void Compare(int32_t rows, int32_t cols, bool real, const Ours &ours,
 } // namespace
 
 int main() {
-#ifdef QX_PEER_FFTW3
-    fftw_set_timelimit(10); // for FFTW_MEASURE to plan the largest
-#endif
     Totals complex{Ratios("complex, two dimensions"), Ratios("complex, two dimensions")};
     Totals real{Ratios("real, two dimensions"), Ratios("real, two dimensions")};
     std::printf("time of ours; ratios to FFTW with FFTW_ESTIMATE and FFTW_MEASURE\n");

@@ -13,7 +13,8 @@ HEAD = """# Speed
 Written by `bench/run --all`. Each row is a geometric mean of the ratios time of ours / time of the
 peer, one thread, plans and the like made outside the timed loop; below 1 is faster than the peer.
 The shortest of interleaved runs; on a machine with a load of its own (below) single worst cases say
-little.
+little, and FFTW_MEASURE, which plans by timing and for ten seconds at most, chooses badly for the
+longest transforms.
 """
 
 
