@@ -222,6 +222,10 @@ ErrorCode MedianFilterRun(const DBL *x, int32_t n, int32_t leftRank, int32_t rig
             std::memmove(y, x, static_cast<std::size_t>(n) * sizeof(DBL));
         return 0;
     }
+    if (leftRank / 4 > n) { // the zeros before x outnumber it, and the median is always one of them
+        Fill(y, n, 0.0);
+        return 0;
+    }
     const Job job = {x, n, leftRank, rightRank, y};
     const bool hasNaN = HasNaN(x, n);
     if (!hasNaN && StretchedFilter::pays(job))
