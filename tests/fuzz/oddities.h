@@ -26,7 +26,6 @@ constexpr KeptOddity keptOddities[] = {
     {"AutoCorrelation", Oddity::SizeBeyondBlock, "the resize is not looked at"},
     {"AutoCorrelation80", Oddity::SizeBeyondBlock, "the resize is not looked at"},
     {"Deconvolution", Oddity::SizeBeyondBlock, "the resize is not looked at"},
-    {"SavitzkyGolayCoefH", Oddity::OldContentStays, "differentiators that are not wanted"},
     {"ReComplexModulatorH", Oddity::OldContentStays, "where x is empty"},
     {"ChirpZT_head", Oddity::TimeFollowsNumber, "the direct sum has n count powers"},
     {"CxChirpZT_head", Oddity::TimeFollowsNumber, "the direct sum has n count powers"},

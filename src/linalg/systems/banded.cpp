@@ -101,7 +101,7 @@ ErrorCode SolveTridiagonal(bool transposed, int32_t n, const DBL *lower, const D
                            const DBL *upper, const DBL *upper2, const I32 *pivots,
                            int32_t rightSides, DBL *b) {
     for (int32_t i = 0; i < n; ++i)
-        if (pivots[i] - 1 != i && (pivots[i] - 1 != i + 1 || i + 1 == n))
+        if (pivots[i] != i + 1 && (pivots[i] != i + 2 || i + 1 == n))
             return ErrIndexOutOfRange;
     Diagonals d;
     AlignedScratch<ElementType::DBL> x;
