@@ -20,7 +20,11 @@ DBL1D Waveform(Call &c, int number = 0) { return c.in<DBL>(number, c.n + usualSi
 
 ReferenceLevels *Percent(Call &c, int number) {
     auto *levels = c.record<ReferenceLevels>(number);
-    *levels = {90, 50, 10, 1};
+    // Field by field: a whole record would bring bytes of no meaning between its fields.
+    levels->high = 90;
+    levels->mid = 50;
+    levels->low = 10;
+    levels->percent = 1;
     return levels;
 }
 
