@@ -83,9 +83,10 @@ class Installed(Using):
                          "2.0\n")
 
 
+@unittest.skipUnless("QX_TEST_ALL" in os.environ, "builds the whole library once more: ./test --all")
 class AsFolder(Using):
     def test_add_subdirectory(self):
-        # The whole library is built: at the lowest cost, and kept for the next run.
+        # At the lowest cost, and kept for the next run.
         self.built(BUILD / "as_folder", f"-DQX_SOURCE={SOURCE}", "-DCMAKE_BUILD_TYPE=Debug",
                    "-DCMAKE_CXX_FLAGS_DEBUG=-O0")
 
