@@ -158,11 +158,11 @@ QX_API ErrorCode CxHessenberg_head(QX_INOUT CDB2D a, int32_t low, int32_t high, 
 /** Balances the square matrix a in its place. job 0 does nothing; 1 permutes rows and columns so that
     eigenvalues are isolated in the corners; 2 multiplies rows and columns by powers of two so that
     their sums of absolute values become alike, but none whose sums or factor lie outside 2^-970 to
-    2^970; 3 does both. Rows and columns *low to *high, counted
-    from 1, are the block between the corners. scale[i] is the factor of row and column i of the block;
-    outside it is the number, from 1, of the row with which row i was exchanged, the last ones first,
-    from n down to high + 1, then those from 1 to low - 1. B. N. Parlett and C. Reinsch, "Balancing a
-    matrix for calculation of eigenvalues and eigenvectors", 1969.
+    2^970; 3 does both. Rows and columns *low to *high, counted from 1, are the block between the
+    corners. scale[i] is the factor of row and column i of the block; outside it is the number, from 1,
+    of the row with which row i was exchanged, the last ones first, from n down to high + 1, then those
+    from 1 to low - 1. B. N. Parlett and C. Reinsch, "Balancing a matrix for calculation of eigenvalues
+    and eigenvectors", 1969.
     Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrInvalidSelector (job is not 0
     to 3), ErrOutOfMemory (no memory), ErrNonFiniteInput (an element is not finite). */
 QX_API ErrorCode MatrixBalance_head(QX_INOUT DBL2D a, int32_t job, QX_OUT int32_t *low,
