@@ -78,7 +78,7 @@ Outcome KroneckerProduct(In<Matrix> a, In<Matrix> b, Out<Matrix> out) {
         return ErrOutOfMemory;
     if (const Outcome bad = out.resize(static_cast<int32_t>(rows), static_cast<int32_t>(cols)))
         return bad;
-    auto *element = out.data();
+    typename Out<Matrix>::T *element = out.data();
     for (std::ptrdiff_t i = 0; i < rows; ++i)
         for (std::ptrdiff_t j = 0; j < cols; ++j)
             *element++ = a.data()[i / b.rows() * a.cols() + j / b.cols()] *

@@ -85,7 +85,7 @@ ErrorCode VectorProduct(const typename Element<E>::type *a, int32_t m, int32_t n
         Scalar sum[Rows];
         for (int r = 0; r < Rows; ++r)
             sum[r] = ScalarOf<E>::Of(0.0);
-        const auto *const row = a + std::ptrdiff_t{first} * n;
+        const ElementOf<E> *const row = a + std::ptrdiff_t{first} * n;
         for (std::ptrdiff_t j = 0; j < n; ++j)
             for (int r = 0; r < Rows; ++r)
                 sum[r] = sum[r] + row[std::ptrdiff_t{r} * n + j] * x[j];

@@ -62,8 +62,8 @@ Outcome FindRoots(InOut<CDB1D> coef, int32_t maxIterations) {
 CDB Widened(double x) { return {x, 0.0}; }
 CDB Widened(const CDB &z) { return z; }
 
-template <class Root>
-Outcome CopyOut(const Root *roots, int32_t count, auto &out) {
+template <class Handle>
+Outcome CopyOut(const typename Out<Handle>::T *roots, int32_t count, Out<Handle> &out) {
     if (const Outcome bad = out.resize(count))
         return bad;
     for (std::ptrdiff_t i = 0; i < count; ++i)
