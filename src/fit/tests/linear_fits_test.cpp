@@ -234,7 +234,7 @@ TEST(LinearFits, AllMethodsSolveTheNormalEquations) {
                 }
                 const auto model = [&](std::size_t i) {
                     Long f = 0;
-                    for (int32_t j = 0; j < k; ++j)
+                    for (std::size_t j = 0; j < exact.c.size(); ++j)
                         f += exact.c[j] * problem.rows[i][j];
                     return f;
                 };
