@@ -6,6 +6,7 @@
 #include "bench/timing.h"
 #include "fft/plan.h"
 
+#include <algorithm>
 #include <cstdint>
 #include <cstring>
 #include <memory>
@@ -163,6 +164,13 @@ std::vector<Group> Groups() {
              true}};
 }
 
+bool IsGroup(const char *name) {
+    const std::vector<Group> groups = Groups();
+    return std::strcmp(name, "plan") == 0 ||
+           std::any_of(groups.begin(), groups.end(),
+                       [name](const Group &group) { return std::strcmp(name, group.name) == 0; });
+}
+
 void ReportPlans() {
     std::printf("-- plan\n");
     for (const int32_t n : {1024, 65536, 1000000, 10007}) {
@@ -186,6 +194,11 @@ int main(int argc, char **argv) {
                 return true;
         return argc == 1;
     };
+    for (int i = 1; i < argc; ++i)
+        if (!IsGroup(argv[i])) {
+            std::fprintf(stderr, "bench_fft: there is no group %s\n", argv[i]);
+            return 2;
+        }
     std::printf("time of ours; ratios to FFTW with FFTW_ESTIMATE and FFTW_MEASURE\n");
     for (const Group &group : Groups()) {
         if (!wanted(group.name))
