@@ -69,8 +69,25 @@ def array_cases(n):
     ]
 
 
+def coordinate_cases(n):
+    points = np.random.default_rng(3).normal(size=(3, n))
+    direction = qx.call("Euler2Direction_head", 0.3, -0.1, 0.2)
+
+    def spherical():
+        from_axis = np.hypot(points[0], points[1])
+        return (np.hypot(from_axis, points[2]), np.arctan2(points[1], points[0]),
+                np.arctan2(from_axis, points[2]))
+
+    return [
+        ("rotate", lambda: qx.call("CoordRotationDirection_head", *points, direction),
+         lambda: direction @ points),
+        ("to spherical", lambda: qx.call("CoordConversion_head", 0, 1, *points), spherical),
+    ]
+
+
 GROUPS = [("noise, called from Python", noise_cases), ("waves, called from Python", wave_cases),
-          ("scaling and unwrapping, called from Python", array_cases)]
+          ("scaling and unwrapping, called from Python", array_cases),
+          ("coordinates, called from Python", coordinate_cases)]
 
 
 def seconds(function, repeats):
