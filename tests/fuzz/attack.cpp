@@ -100,24 +100,34 @@ Disturbance SomeDisturbance(Random &random) {
     return some;
 }
 
-int32_t Attacked(const Disturbance &disturbance, unsigned char rubbish,
+Observed Observe(const Disturbance &disturbance, unsigned char rubbish,
                  const std::function<int32_t()> &call) {
     ResetHost(disturbance.refuseAt, disturbance.refusal);
     Host().largestBlock = largestBlock;
     Host().freshByte = rubbish;
+    Observed seen;
     const double before = ProcessorSeconds();
-    int32_t result = 0;
     try {
-        const HeapProbe probe(disturbance.allocationFails, largestBlock);
-        result = call();
+        const HeapProbe probe(disturbance.allocationFails, largestBlock, rubbish);
+        seen.result = call();
+        seen.lacksMemory = probe.refusals() > 0;
     } catch (const std::exception &error) {
-        Tell("%s", error.what());
+        seen.fault = error.what();
     }
-    const double seconds = ProcessorSeconds() - before;
+    seen.seconds = ProcessorSeconds() - before;
+    seen.reshapes = Host().reshapes;
     ResetHost();
-    if (seconds > secondsPerCall)
-        Tell("took %.1f s of the processor", seconds);
-    return result;
+    return seen;
+}
+
+int32_t Attacked(const Disturbance &disturbance, unsigned char rubbish,
+                 const std::function<int32_t()> &call) {
+    const Observed seen = Observe(disturbance, rubbish, call);
+    if (!seen.fault.empty())
+        Tell("%s", seen.fault.c_str());
+    if (seen.seconds > secondsPerCall)
+        Tell("took %.1f s of the processor", seen.seconds);
+    return seen.result;
 }
 
 void CheckStatus(const char *name, ErrorCode status, const Disturbance &disturbance, bool shares) {

@@ -3,11 +3,13 @@
 
 #include "qx/frame.h"
 #include "tests/fuzz/content.h"
+#include "tests/support/hostile_host.h"
 
 #include <atomic>
 #include <cstdint>
 #include <functional>
 #include <string>
+#include <vector>
 
 namespace qx::test {
 
@@ -52,8 +54,19 @@ struct Disturbance {
 };
 Disturbance SomeDisturbance(Random &random);
 
-// Makes the call in a host that refuses as told and whose new blocks hold `rubbish`, and looks at
-// its time. Gives the function result.
+// What there is to see of one call besides its outputs.
+struct Observed {
+    int32_t result = 0; // of the function
+    std::vector<Reshape> reshapes;
+    bool lacksMemory = false; // the heap has refused a request
+    std::string fault;        // what the host complains of
+    double seconds = 0;       // of the processor
+};
+// Makes the call in a host that refuses as told and whose new blocks, as those of the heap, hold
+// `rubbish`.
+Observed Observe(const Disturbance &disturbance, unsigned char rubbish,
+                 const std::function<int32_t()> &call);
+// The same, and tells of a fault and of a long time. Returns the function result.
 int32_t Attacked(const Disturbance &disturbance, unsigned char rubbish,
                  const std::function<int32_t()> &call);
 // Tells of a code that the export does not document.

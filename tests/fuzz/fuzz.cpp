@@ -1,7 +1,7 @@
 #include "tests/fuzz/attack.h"
 #include "tests/fuzz/oddities.h"
 #include "tests/fuzz/recipe_case.h"
-#include "tests/fuzz/thunk.h"
+#include "tests/fuzz/scenario.h"
 #include "tests/support/hostile_host.h"
 
 #include <algorithm>
@@ -11,14 +11,7 @@
 #include <csignal>
 #include <cstdio>
 #include <cstdlib>
-#include <cstring>
-#include <optional>
 #include <thread>
-#include <unistd.h>
-
-#ifdef __GLIBC__
-#include <malloc.h>
-#endif
 
 // Calls every export of the catalogue with arguments of every kind (each third time with those of
 // its recipe, spoilt here and there), in a host that refuses, and looks at what holds whatever the
@@ -36,394 +29,68 @@ namespace qx::test {
 
 namespace {
 
-// One argument as it stands before a call; blocks are made from it for each run.
-struct Argument {
-    int32_t rows = 0, cols = 0;       // of an array; a 1-D array has cols only
-    std::vector<unsigned char> bytes; // elements of an array, or what a pointer shows
-    int64_t whole = 0;
-    double real = 0;
-    int aliasOf = -1; // the array argument whose handle this one shares
-};
-
-// One call with all that happens around it.
-struct Scenario {
-    const Thunk *thunk;
-    std::vector<Argument> arguments;
-    Disturbance disturbance;
-};
-
-// An array argument before `at` whose handle it may share: one of the two is an output. Arrays that
-// share the handle of a third do not come into question, so that no two outputs are one.
-int SomeAlias(Random &random, const Scenario &scenario, std::size_t at) {
-    const std::vector<Parameter> &parameters = scenario.thunk->parameters;
-    const auto isShared = [&](std::size_t i) {
-        return std::any_of(scenario.arguments.begin(), scenario.arguments.end(),
-                           [&](const Argument &a) { return a.aliasOf == static_cast<int>(i); });
-    };
-    std::vector<int> candidates;
-    for (std::size_t i = 0; i < at; ++i)
-        if (parameters[i].kind == parameters[at].kind &&
-            parameters[i].element == parameters[at].element &&
-            parameters[i].isOut != parameters[at].isOut && scenario.arguments[i].aliasOf < 0 &&
-            !isShared(i))
-            candidates.push_back(static_cast<int>(i));
-    if (candidates.empty())
-        return -1;
-    return candidates[static_cast<std::size_t>(
-        random.below(static_cast<int32_t>(candidates.size())))];
-}
-
-Argument SomeArgument(Random &random, const Parameter &parameter, const Sizes &sizes,
-                      bool isUsual) {
-    Argument argument;
-    const auto content = static_cast<Content>(random.below(isUsual ? usualContents : allContents));
-    if (parameter.isArray()) {
-        argument.rows = parameter.dimensions() == 1 ? 1 : SomeDimension(random, sizes, isUsual);
-        argument.cols = SomeDimension(random, sizes, isUsual);
-        if (parameter.dimensions() == 2) { // what is cubic in the size stays small
-            argument.rows %= 33;
-            argument.cols %= 33;
-        }
-        argument.bytes =
-            SomeElements(random, parameter.element, argument.rows, argument.cols, content);
-    } else if (parameter.kind == Kind::Value || parameter.kind == Kind::Reference) {
-        argument.whole = SomeWhole(random, sizes);
-        argument.real = SomeReal(random, sizes, isUsual);
-        argument.bytes.resize(ElementSize(parameter.element));
-        const auto whole = static_cast<int32_t>(argument.whole);
-        if (parameter.element == "DBL")
-            std::memcpy(argument.bytes.data(), &argument.real, sizeof argument.real);
-        else if (argument.bytes.size() <= sizeof whole)
-            std::memcpy(argument.bytes.data(), &whole, argument.bytes.size());
-        else
-            argument.bytes = SomeElements(random, parameter.element, 1, 1, content);
-    } else if (!parameter.element.empty()) {
-        argument.bytes = SomeElements(random, parameter.element, 1, 1, content);
-    }
-    return argument;
-}
-
-Scenario SomeScenario(Random &random, const Thunk &thunk) {
-    const bool isUsual = random.oneIn(2);
-    const Sizes sizes = SomeSizes(random);
-    Scenario scenario{&thunk, {}, {}};
-    const bool shares = random.oneIn(6);
+// Everything that one call is held to by itself.
+Outcome CallAndCheck(const Scenario &scenario, Node &node, const Manner &manner) {
+    const Thunk &thunk = *scenario.thunk;
+    PreparedCall call(scenario, node, manner);
+    const ErrorCode status =
+        call.status(Attacked(scenario.disturbance, manner.rubbish, [&call] { return call(); }));
+    CheckStatus(thunk.name, status, scenario.disturbance, scenario.shares());
+    CheckHost();
     for (std::size_t i = 0; i < thunk.parameters.size(); ++i) {
         const Parameter &parameter = thunk.parameters[i];
-        Argument argument = SomeArgument(random, parameter, sizes, isUsual);
-        if (IsKept(thunk.name, Oddity::TimeFollowsNumber))
-            argument.whole %= 2000;
-        if (shares && parameter.isArray()) {
-            argument.aliasOf = SomeAlias(random, scenario, i);
-            if (argument.aliasOf >= 0) {
-                const int aliasOf = argument.aliasOf;
-                argument = scenario.arguments[static_cast<std::size_t>(aliasOf)];
-                argument.aliasOf = aliasOf;
-            }
-        }
-        scenario.arguments.push_back(std::move(argument));
+        if (!parameter.isArray())
+            continue;
+        if (!call.sizesFitBlock(i) && !IsKept(thunk.name, Oddity::SizeBeyondBlock))
+            Tell("the sizes of %s exceed its block", parameter.name);
+        if (!call.inputIsUnchanged(i))
+            Tell("the input %s has changed", parameter.name);
     }
-    scenario.disturbance = SomeDisturbance(random);
-    return scenario;
+    if (status < 0 || status == statusNoMemory) // an output may keep what it held
+        return {status, 0};
+    ValueHash hash;
+    for (const OutputValue &value : call.outputs())
+        hash.add(value);
+    return {status, hash.sizes() ^ hash.elements()};
 }
 
-// The words that a node keeps between its calls.
-struct Node {
-    void *slots[4] = {};
-    void *instance = nullptr;
-    int32_t (*release)(void **) = nullptr;
-    ~Node() {
-        for (void *slot : slots)
-            RunSweepOf(slot);
-        if (instance != nullptr && release != nullptr)
-            release(&instance);
-    }
-};
-
-// How a call is made. The second time what no result may depend on is another: what memory and
-// outputs hold before, and whether arrays share a handle.
-struct Manner {
-    bool apart = false;
-    unsigned char rubbish = 0x17;
-};
-
-class Blocks {
-public:
-    Blocks(const Scenario &scenario, const Manner &manner) : scenario_(scenario) {
-        for (std::size_t i = 0; i < scenario.arguments.size(); ++i) {
-            const Argument &argument = scenario.arguments[i];
-            const Parameter &parameter = scenario.thunk->parameters[i];
-            void *handle = nullptr;
-            if (parameter.isArray() && argument.aliasOf >= 0 && !manner.apart) {
-                handle = handles_[static_cast<std::size_t>(argument.aliasOf)];
-            } else if (parameter.isArray()) {
-                handle = NewArray(parameter, argument, isRead(i) ? nullptr : &manner.rubbish);
-                own_.push_back(handle);
-            }
-            handles_.push_back(handle);
-        }
-    }
-    ~Blocks() {
-        for (void *handle : own_)
-            detail::FreeBlock(handle);
-    }
-    Blocks(const Blocks &) = delete;
-    Blocks &operator=(const Blocks &) = delete;
-
-    void *handle(std::size_t i) const { return handles_[i]; }
-    unsigned char *block(std::size_t i) const {
-        return *static_cast<unsigned char **>(handles_[i]);
-    }
-    std::vector<int32_t> sizes(std::size_t i) const {
-        std::vector<int32_t> found(static_cast<std::size_t>(parameter(i).dimensions()));
-        std::memcpy(found.data(), block(i), 4 * found.size());
-        return found;
-    }
-    const unsigned char *elements(std::size_t i) const {
-        return block(i) + 4 * parameter(i).dimensions();
-    }
-    // Of the elements, as the sizes tell; none where the block has not so many.
-    std::optional<std::size_t> bytes(std::size_t i) const {
-        std::size_t count = 1;
-        for (const int32_t size : sizes(i)) {
-            if (size < 0)
-                return std::nullopt;
-            count *= static_cast<std::size_t>(size);
-        }
-        const std::size_t header = 4 * static_cast<std::size_t>(parameter(i).dimensions());
-        const std::size_t size = count * ElementSize(parameter(i).element);
-        if (size > detail::BlockSize(handles_[i]) - header)
-            return std::nullopt;
-        return size;
-    }
-    bool isShared(std::size_t i) const {
-        return std::count(handles_.begin(), handles_.end(), handles_[i]) > 1;
-    }
-
-private:
-    const Parameter &parameter(std::size_t i) const { return scenario_.thunk->parameters[i]; }
-    bool isRead(std::size_t i) const {
-        bool reads = parameter(i).isIn;
-        for (std::size_t other = i + 1; other < scenario_.arguments.size(); ++other)
-            reads |=
-                scenario_.arguments[other].aliasOf == static_cast<int>(i) && parameter(other).isIn;
-        return reads;
-    }
-    static void *NewArray(const Parameter &parameter, const Argument &argument,
-                          const unsigned char *rubbish) {
-        const int32_t rows = parameter.dimensions() == 1 ? argument.cols : argument.rows;
-        void *handle = detail::NewBlock(parameter.dimensions(), TypeCode(parameter.element),
-                                        ElementSize(parameter.element), rows, argument.cols);
-        unsigned char *elements =
-            *static_cast<unsigned char **>(handle) + 4 * parameter.dimensions();
-        if (rubbish != nullptr)
-            std::fill_n(elements, argument.bytes.size(), *rubbish);
-        else if (!argument.bytes.empty())
-            std::memcpy(elements, argument.bytes.data(), argument.bytes.size());
-        return handle;
-    }
-
-    const Scenario &scenario_;
-    std::vector<void *> handles_, own_;
-};
-
-class Hash {
-public:
-    // A NaN counts as a NaN: its sign and payload are the processor's.
-    void add(const unsigned char *bytes, std::size_t count, bool isReal) {
-        for (std::size_t i = 0; i < count; i += 8) {
-            uint64_t word = 0;
-            std::memcpy(&word, bytes + i, count - i < 8 ? count - i : 8);
-            double real;
-            std::memcpy(&real, &word, sizeof real);
-            word = isReal && real != real ? 1 : word;
-            value_ = (value_ ^ word) * 0x9E3779B97F4A7C15U;
-            value_ ^= value_ >> 29;
-        }
-    }
-    uint64_t value() const { return value_; }
-
-private:
-    uint64_t value_ = 0x632BE59BD9B4E019U;
-};
-
-// Everything that one call is held to by itself.
-class Run {
-public:
-    Run(const Scenario &scenario, Node &node, const Manner &manner)
-        : scenario_(scenario), thunk_(*scenario.thunk), manner_(manner), blocks_(scenario, manner) {
-        pointed_.resize(thunk_.parameters.size());
-        std::size_t slots = 0;
-        for (std::size_t i = 0; i < thunk_.parameters.size(); ++i) {
-            const Parameter &parameter = thunk_.parameters[i];
-            const Argument &argument = scenario.arguments[i];
-            pointed_[i] = argument.bytes;
-            if (!parameter.isIn)
-                std::fill(pointed_[i].begin(), pointed_[i].end(), manner.rubbish);
-            Value value{pointed_[i].data(), argument.whole, argument.real};
-            if (parameter.isArray())
-                value.pointer = blocks_.handle(i);
-            else if (parameter.kind == Kind::Slot)
-                value.pointer = &node.slots[slots++ % 4];
-            else if (parameter.kind == Kind::Instance)
-                value.pointer = &node.instance;
-            else if (parameter.kind == Kind::Error)
-                value.pointer = &error_;
-            hasError_ |= parameter.kind == Kind::Error;
-            values_.push_back(value);
-        }
-        node.release = thunk_.release;
-    }
-
-    Outcome call() {
-        const int32_t result = Attacked(scenario_.disturbance, manner_.rubbish,
-                                        [this] { return thunk_.call(values_.data()); });
-        status_ = hasError_ ? error_ : thunk_.returnsCode ? result : 0;
-        const bool shares =
-            std::any_of(scenario_.arguments.begin(), scenario_.arguments.end(),
-                        [](const Argument &argument) { return argument.aliasOf >= 0; });
-        CheckStatus(thunk_.name, status_, scenario_.disturbance, shares);
-        checkBlocks();
-        return {status_, hash()};
-    }
-
-private:
-    void checkBlocks() const {
-        CheckHost();
-        for (std::size_t i = 0; i < thunk_.parameters.size(); ++i) {
-            const Parameter &parameter = thunk_.parameters[i];
-            if (!parameter.isArray())
-                continue;
-            if (!blocks_.bytes(i) && !IsKept(thunk_.name, Oddity::SizeBeyondBlock))
-                Tell("the sizes of %s exceed its block", parameter.name);
-            else if (blocks_.bytes(i) && !parameter.isOut && !blocks_.isShared(i))
-                checkInput(i);
-        }
-    }
-    void checkInput(std::size_t i) const {
-        const Argument &argument = scenario_.arguments[i];
-        const unsigned char *elements = blocks_.elements(i);
-        const bool isSame = std::equal(elements, elements + *blocks_.bytes(i),
-                                       argument.bytes.begin(), argument.bytes.end());
-        if (!isSame)
-            Tell("the input %s has changed", thunk_.parameters[i].name);
-    }
-    // A record by its fields: what lies between them is nobody's.
-    void addPointed(Hash &hash, std::size_t i) const {
-        const std::string &element = thunk_.parameters[i].element;
-        const auto record = AllRecords().find(element);
-        if (record == AllRecords().end()) {
-            hash.add(pointed_[i].data(), pointed_[i].size(), element == "DBL");
-            return;
-        }
-        for (const RecordField &field : record->second.fields)
-            hash.add(pointed_[i].data() + field.offset, field.count * ElementSize(field.element),
-                     field.element == "DBL");
-    }
-    uint64_t hash() const {
-        Hash hash;
-        // An output may keep what it held.
-        if (status_ < 0 || status_ == statusNoMemory)
-            return 0;
-        for (std::size_t i = 0; i < thunk_.parameters.size(); ++i) {
-            const Parameter &parameter = thunk_.parameters[i];
-            const bool isReal = parameter.element == "DBL" || parameter.element == "CDB";
-            if (parameter.isArray() && parameter.isOut && blocks_.bytes(i)) {
-                const std::vector<int32_t> sizes = blocks_.sizes(i);
-                hash.add(reinterpret_cast<const unsigned char *>(sizes.data()), 4 * sizes.size(),
-                         false);
-                hash.add(blocks_.elements(i), *blocks_.bytes(i), isReal);
-            } else if (!parameter.isArray() && parameter.isOut && !parameter.element.empty() &&
-                       parameter.kind != Kind::Error) {
-                addPointed(hash, i);
-            }
-        }
-        return hash.value();
-    }
-
-    const Scenario &scenario_;
-    const Thunk &thunk_;
-    Manner manner_;
-    Blocks blocks_;
-    std::vector<std::vector<unsigned char>> pointed_;
-    std::vector<Value> values_;
-    ErrorCode error_ = 0, status_ = 0;
-    bool hasError_ = false;
-};
-
-Outcome RunAlone(const Scenario &scenario, const Manner &manner) {
-#ifdef __GLIBC__
-    if (options.threads == 1)
-        mallopt(M_PERTURB, manner.rubbish);
-#endif
+Outcome CallAlone(const Scenario &scenario, const Manner &manner) {
     Node node;
-    return Run(scenario, node, manner).call();
+    return CallAndCheck(scenario, node, manner);
 }
 
 struct Tally {
     int64_t calls = 0, successes = 0;
 };
 
-uint64_t SeedOf(const std::string &name, int64_t round) {
-    uint64_t seed = options.seed;
-    for (const char c : name)
-        seed = seed * 0x100000001B3U + static_cast<unsigned char>(c);
-    return seed * 0x100000001B3U + static_cast<uint64_t>(round);
-}
-
 void RunThunkCase(const Thunk &thunk, Random &random, Tally &tally) {
     Node node;
     for (int32_t left = 1 + random.below(3); left > 0; --left) {
         const Scenario scenario = SomeScenario(random, thunk);
-        const bool shares = std::any_of(scenario.arguments.begin(), scenario.arguments.end(),
-                                        [](const Argument &a) { return a.aliasOf >= 0; });
+        const bool shares = scenario.shares();
         const bool again = scenario.disturbance.isNone() && (shares || random.oneIn(4));
         Outcome outcome;
         {
             const TinyWorkspace workspace(scenario.disturbance.workspace);
             if (again || scenario.disturbance.workspace != 0)
-                outcome = RunAlone(scenario, {});
+                outcome = CallAlone(scenario, {});
             else
-                outcome = Run(scenario, node, {}).call();
+                outcome = CallAndCheck(scenario, node, {});
         }
         ++tally.calls;
         tally.successes += outcome.status >= 0;
         if (!again)
             continue;
-        const Outcome second = RunAlone(scenario, {shares, 0xC2});
+        const Outcome second = CallAlone(scenario, {shares, 0xC2});
         CheckRepetition(thunk.name, outcome, second, shares);
     }
-}
-
-// An export with the ways to call it.
-struct Subject {
-    std::string name;
-    const Thunk *thunk = nullptr;
-    std::vector<const Recipe *> recipes;
-};
-
-const std::vector<Subject> &AllSubjects() {
-    static const std::vector<Subject> all = [] {
-        std::map<std::string, Subject> byName;
-        for (const Thunk &thunk : AllThunks())
-            byName[thunk.name].thunk = &thunk;
-        for (const Recipe &recipe : AllRecipes())
-            byName[recipe.exportName()].recipes.push_back(&recipe);
-        std::vector<Subject> subjects;
-        for (auto &[name, subject] : byName) {
-            subject.name = name;
-            subjects.push_back(std::move(subject));
-        }
-        return subjects;
-    }();
-    return all;
 }
 
 void RunCase(const Subject &subject, int64_t round, Tally &tally) {
     current->name = subject.name.c_str();
     current->since = time(nullptr);
     current->round = round;
-    Random random(SeedOf(subject.name, round));
+    Random random(SeedOf(options.seed, subject.name, round));
     const auto recipes = static_cast<int32_t>(subject.recipes.size());
     if (recipes == 0 || (subject.thunk != nullptr && !random.oneIn(3))) {
         RunThunkCase(*subject.thunk, random, tally);

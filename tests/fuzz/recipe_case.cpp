@@ -7,20 +7,8 @@
 
 namespace qx::test {
 
-namespace {
-
-// How one call differs from its recipe; the same each time it is made.
-struct Spoiling {
-    int32_t n;
-    uint64_t seed;        // of what is put into the arrays
-    bool spoilsContent;   // else the arrays are the recipe's
-    int input, dimension; // whose size is another
-    int32_t size;         // negative for none
-    Disturbance disturbance;
-};
-
-Spoiling SomeSpoiling(Random &random, const Recipe &recipe) {
-    Spoiling some = {};
+RecipeSpoiling SomeSpoiling(Random &random, const Recipe &recipe) {
+    RecipeSpoiling some = {};
     const auto &sizes = recipe.sizes;
     const int32_t least = *std::min_element(sizes.begin(), sizes.end());
     const int32_t most =
@@ -38,7 +26,9 @@ Spoiling SomeSpoiling(Random &random, const Recipe &recipe) {
     return some;
 }
 
-const char *NameOf(ElementType element) {
+namespace {
+
+const char *PartOf(ElementType element) {
     switch (element) {
     case ElementType::I32:
         return "I32";
@@ -64,7 +54,7 @@ void SpoilElements(Random &random, unsigned char *elements, ElementType element,
     const int32_t parts =
         element == ElementType::CDB || element == ElementType::CSG ? 2 * cols : cols;
     const auto content = static_cast<Content>(random.below(allContents));
-    const std::string name = NameOf(element);
+    const std::string name = PartOf(element);
     const std::vector<unsigned char> others = SomeElements(random, name, rows, parts, content);
     const std::size_t each = ElementSize(name);
     const int32_t oneIn = random.oneIn(3) ? 1 : 8;
@@ -73,17 +63,24 @@ void SpoilElements(Random &random, unsigned char *elements, ElementType element,
             std::memcpy(elements + at, others.data() + at, each);
 }
 
-Outcome RunOnce(const Recipe &recipe, const Spoiling &spoiling, unsigned char rubbish) {
-    Call call(spoiling.n);
-    Random content(spoiling.seed);
+} // namespace
+
+void Spoil(Call &call, const RecipeSpoiling &spoiling) {
     if (spoiling.spoilsContent)
-        call.spoil(
-            [&content](unsigned char *elements, ElementType element, int32_t rows, int32_t cols) {
-                const HeapProbe::Pause pause;
-                SpoilElements(content, elements, element, rows, cols);
-            });
+        call.spoil([content = Random(spoiling.seed)](unsigned char *elements, ElementType element,
+                                                     int32_t rows, int32_t cols) mutable {
+            const HeapProbe::Pause pause;
+            SpoilElements(content, elements, element, rows, cols);
+        });
     if (spoiling.size >= 0)
         call.alter(spoiling.input, spoiling.dimension, spoiling.size);
+}
+
+namespace {
+
+Outcome RunOnce(const Recipe &recipe, const RecipeSpoiling &spoiling, unsigned char rubbish) {
+    Call call(spoiling.n);
+    Spoil(call, spoiling);
     const std::string name = recipe.exportName();
     const int32_t result =
         Attacked(spoiling.disturbance, rubbish, [&] { return recipe.run(call); });
@@ -103,7 +100,7 @@ Outcome RunOnce(const Recipe &recipe, const Spoiling &spoiling, unsigned char ru
 } // namespace
 
 Outcome RunRecipeCase(Random &random, const Recipe &recipe) {
-    const Spoiling spoiling = SomeSpoiling(random, recipe);
+    const RecipeSpoiling spoiling = SomeSpoiling(random, recipe);
     const bool again = spoiling.disturbance.isNone() && random.oneIn(4);
     Outcome outcome;
     {

@@ -2,6 +2,11 @@
 
 #include <cerrno>
 #include <cstddef>
+#include <cstring>
+
+#ifdef __linux__
+#include <malloc.h>
+#endif
 
 #if defined(__linux__) && !defined(__SANITIZE_ADDRESS__) && !defined(__SANITIZE_THREAD__)
 #define QX_HEAP_PROBE 1
@@ -23,21 +28,24 @@ struct Watch {
     int32_t allocations;
     int32_t live;
     void (*hook)(); // in place of a failure
+    int32_t refusals;
+    int fresh; // what new blocks hold; negative for anything
 };
 // Of the initial-exec kind, so that reading it never allocates.
 __attribute__((tls_model("initial-exec"))) thread_local Watch watch;
 
 } // namespace
 
-HeapProbe::HeapProbe(int32_t failAt, std::size_t largest) {
-    watch = {true, failAt, largest, 0, 0, nullptr};
+HeapProbe::HeapProbe(int32_t failAt, std::size_t largest, int fresh) {
+    watch = {true, failAt, largest, 0, 0, nullptr, 0, fresh};
 }
 HeapProbe::HeapProbe(int32_t hookAt, void (*hook)()) {
-    watch = {true, hookAt, std::numeric_limits<std::size_t>::max(), 0, 0, hook};
+    watch = {true, hookAt, std::numeric_limits<std::size_t>::max(), 0, 0, hook, 0, -1};
 }
 HeapProbe::~HeapProbe() { watch.on = false; }
 int32_t HeapProbe::allocations() const { return watch.allocations; }
 int32_t HeapProbe::liveAllocations() const { return watch.live; }
+int32_t HeapProbe::refusals() const { return watch.refusals; }
 HeapProbe::Pause::Pause() : wasWatching_(watch.on) { watch.on = false; }
 HeapProbe::Pause::~Pause() { watch.on = wasWatching_; }
 
@@ -58,6 +66,7 @@ bool Refuses(std::size_t size) {
     }
     if (isMeant || size > watch.largest) {
         errno = ENOMEM;
+        ++watch.refusals;
         return true;
     }
     return false;
@@ -66,6 +75,18 @@ bool Refuses(std::size_t size) {
 void *Granted(void *block) {
     if (watch.on && block != nullptr)
         ++watch.live;
+    if (watch.on && block == nullptr)
+        ++watch.refusals;
+    return block;
+}
+
+// From byte `from` to the end of what the heap has given.
+void *Fresh(void *block, std::size_t from = 0) {
+    if (watch.on && watch.fresh >= 0 && block != nullptr) {
+        const std::size_t room = malloc_usable_size(block);
+        if (room > from)
+            std::memset(static_cast<unsigned char *>(block) + from, watch.fresh, room - from);
+    }
     return block;
 }
 
@@ -86,7 +107,8 @@ void *__libc_realloc(void *, std::size_t);
 void __libc_free(void *);
 
 __attribute__((visibility("default"))) void *malloc(std::size_t size) {
-    return qx::test::Refuses(size) ? nullptr : qx::test::Granted(__libc_malloc(size));
+    return qx::test::Refuses(size) ? nullptr
+                                   : qx::test::Fresh(qx::test::Granted(__libc_malloc(size)));
 }
 __attribute__((visibility("default"))) void *calloc(std::size_t count, std::size_t size) {
     return qx::test::Refuses(count * size) ? nullptr
@@ -95,7 +117,8 @@ __attribute__((visibility("default"))) void *calloc(std::size_t count, std::size
 __attribute__((visibility("default"))) void *realloc(void *block, std::size_t size) {
     if (qx::test::Refuses(size))
         return nullptr;
-    void *grown = __libc_realloc(block, size);
+    const std::size_t before = block == nullptr ? 0 : malloc_usable_size(block);
+    void *grown = qx::test::Fresh(__libc_realloc(block, size), before);
     return block == nullptr ? qx::test::Granted(grown) : grown;
 }
 __attribute__((visibility("default"))) void free(void *block) {

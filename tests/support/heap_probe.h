@@ -14,9 +14,10 @@ public:
     static bool works();
 
     // Watches from construction to destruction; the n-th allocation fails (0 for none), and so does
-    // each of more than `largest` bytes.
+    // each of more than `largest` bytes. New blocks hold the byte `fresh`, if that is not negative.
     explicit HeapProbe(int32_t failAt = 0,
-                       std::size_t largest = std::numeric_limits<std::size_t>::max());
+                       std::size_t largest = std::numeric_limits<std::size_t>::max(),
+                       int fresh = -1);
     ~HeapProbe();
     HeapProbe(const HeapProbe &) = delete;
     HeapProbe &operator=(const HeapProbe &) = delete;
@@ -26,6 +27,7 @@ public:
 
     int32_t allocations() const;     // malloc, calloc and realloc, failed ones included
     int32_t liveAllocations() const; // allocations less frees
+    int32_t refusals() const;        // those that failed
 
     // While one exists, heap calls are not watched: the host's own.
     class Pause {

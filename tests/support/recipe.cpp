@@ -42,6 +42,26 @@ void AddBytes(Hash &hash, const unsigned char *bytes, std::size_t count) {
     hash.add(bytes + i, count - i);
 }
 
+const char *ElementName(ElementType element) {
+    switch (element) {
+    case ElementType::I32:
+        return "I32";
+    case ElementType::U8:
+        return "U8";
+    case ElementType::U32:
+        return "U32";
+    case ElementType::SGL:
+        return "SGL";
+    case ElementType::CSG:
+        return "CSG";
+    case ElementType::DBL:
+        return "DBL";
+    case ElementType::CDB:
+        return "CDB";
+    }
+    return "";
+}
+
 } // namespace
 
 bool Call::Array::isUnchanged() const {
@@ -209,6 +229,40 @@ uint64_t Call::outputHash(ErrorCode status) const {
     for (const auto &[number, bytes] : records_)
         AddBytes(hash, bytes.data(), bytes.size());
     return hash.value();
+}
+
+std::vector<OutputValue> Call::outputs() const {
+    std::vector<OutputValue> found;
+    const auto add = [&found](const char *kind, int number, const char *element, const void *value,
+                              std::size_t bytes) {
+        found.push_back({kind + std::to_string(number),
+                         element,
+                         {},
+                         static_cast<const unsigned char *>(value),
+                         bytes});
+    };
+    for (const Arrays *arrays : {&inputs_, &outputs_})
+        for (const auto &[number, array] : *arrays) {
+            if (array->role == Role::Input)
+                continue;
+            const std::vector<int32_t> sizes = array->sizes();
+            const bool fits =
+                std::all_of(sizes.begin(), sizes.end(), [](int32_t size) { return size >= 0; }) &&
+                array->blockSize() <= array->room();
+            found.push_back({(arrays == &inputs_ ? "input " : "output ") + std::to_string(number),
+                             ElementName(array->element()), sizes,
+                             array->block() + array->headerSize(),
+                             fits ? array->blockSize() - array->headerSize() : 0});
+        }
+    for (const auto &[number, value] : scalars_)
+        add("scalar ", number, "DBL", &value, sizeof value);
+    for (const auto &[number, value] : complexScalars_)
+        add("complex scalar ", number, "CDB", &value, sizeof value);
+    for (const auto &[number, value] : integers_)
+        add("integer ", number, "I32", &value, sizeof value);
+    for (const auto &[number, bytes] : records_)
+        add("record ", number, "", bytes.data(), bytes.size());
+    return found;
 }
 
 std::string Call::describeOutputs() const {

@@ -66,6 +66,15 @@ private:
 // The content of an array that no function is given for.
 struct FromNoise {};
 
+// What a call has left in one of its outputs.
+struct OutputValue {
+    std::string name;
+    std::string element;        // of the host; empty where it is not known
+    std::vector<int32_t> sizes; // none for a number or a record
+    const unsigned char *elements;
+    std::size_t bytes;
+};
+
 // One call of one export: makes the arguments, keeps the outputs.
 class Call {
 public:
@@ -213,6 +222,8 @@ public:
     // After a failure: arrays without elements, scalars NaN or 0, kept arrays as they were.
     bool outputsAreSettled() const;
     uint64_t outputHash(ErrorCode status) const;
+    // An array whose sizes exceed its block is shown without elements.
+    std::vector<OutputValue> outputs() const;
     std::string describeOutputs() const;
     void releaseNodes();
     ~Call() { releaseNodes(); }

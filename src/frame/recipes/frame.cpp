@@ -7,9 +7,9 @@ namespace {
 const RecipeFile file = {
     {"InitializeAnalysisWorkspaceH",
      "no arrays; the tests of the workspace drive the four together"},
-    {"EnableAnalysisWorkspaceH", "as above"},
-    {"DisableAnalysisWorkspaceH", "as above"},
-    {"UninitializeAnalysisWorkspaceH", "as above"},
+    {"EnableAnalysisWorkspaceH", "as InitializeAnalysisWorkspaceH"},
+    {"DisableAnalysisWorkspaceH", "as InitializeAnalysisWorkspaceH"},
+    {"UninitializeAnalysisWorkspaceH", "as InitializeAnalysisWorkspaceH"},
     {"SetQXRTModule", "changes the process; its test calls it in a process of its own"},
 };
 

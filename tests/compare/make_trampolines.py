@@ -1,0 +1,37 @@
+#!/usr/bin/python3
+"""make_trampolines.py CATALOGUE OUTPUT [--show] [--but NAME...]: writes, for each export of the
+catalogue, a function of its name that jumps to wherever a module has it, so that one program calls
+the exports of any module that it loads. --show: others see the functions, too. --but: not these."""
+
+import argparse
+import json
+
+
+def main():
+    parser = argparse.ArgumentParser(description=__doc__)
+    parser.add_argument("catalogue")
+    parser.add_argument("output")
+    parser.add_argument("--show", action="store_true")
+    parser.add_argument("--but", nargs="*", default=[])
+    options = parser.parse_args()
+    with open(options.catalogue, encoding="utf-8") as file:
+        names = [export["name"] for export in json.load(file)["exports"]]
+    jumps = "".join(
+        f'        ".globl {name}\\n"\n'
+        + ("" if options.show else f'        ".hidden {name}\\n"\n')
+        + f'        ".type {name}, @function\\n"\n'
+        f'        "{name}: jmp *qxExportTargets+{8 * place}(%rip)\\n"\n'
+        for place, name in enumerate(names) if name not in options.but)
+    text = ('#include "tests/compare/trampolines.h"\n\n'
+            f'void *qxExportTargets[{len(names)}];\n\n'
+            '__asm__(".text\\n"\n' + jumps + ");\n\n"
+            "namespace qx::test {\n\nconst std::vector<const char *> &ExportNames() {\n"
+            "    static const std::vector<const char *> all = {"
+            + ", ".join(f'"{name}"' for name in names) +
+            "};\n    return all;\n}\n\n} // namespace qx::test\n")
+    with open(options.output, "w", encoding="utf-8") as file:
+        file.write(text)
+
+
+if __name__ == "__main__":
+    main()

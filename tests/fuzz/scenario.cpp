@@ -1,0 +1,299 @@
+#include "tests/fuzz/scenario.h"
+
+#include "tests/fuzz/oddities.h"
+#include "tests/support/hostile_host.h"
+
+#include <algorithm>
+#include <cstring>
+#include <map>
+
+namespace qx::test {
+
+namespace {
+
+// An array argument before `at` whose handle it may share: one of the two is an output. Arrays that
+// share the handle of a third do not come into question, so that no two outputs are one.
+int SomeAlias(Random &random, const Scenario &scenario, std::size_t at) {
+    const std::vector<Parameter> &parameters = scenario.thunk->parameters;
+    const auto isShared = [&](std::size_t i) {
+        return std::any_of(scenario.arguments.begin(), scenario.arguments.end(),
+                           [&](const Argument &a) { return a.aliasOf == static_cast<int>(i); });
+    };
+    std::vector<int> candidates;
+    for (std::size_t i = 0; i < at; ++i)
+        if (parameters[i].kind == parameters[at].kind &&
+            parameters[i].element == parameters[at].element &&
+            parameters[i].isOut != parameters[at].isOut && scenario.arguments[i].aliasOf < 0 &&
+            !isShared(i))
+            candidates.push_back(static_cast<int>(i));
+    if (candidates.empty())
+        return -1;
+    return candidates[static_cast<std::size_t>(
+        random.below(static_cast<int32_t>(candidates.size())))];
+}
+
+Argument SomeArgument(Random &random, const Parameter &parameter, const Sizes &sizes,
+                      bool isUsual) {
+    Argument argument;
+    const auto content = static_cast<Content>(random.below(isUsual ? usualContents : allContents));
+    if (parameter.isArray()) {
+        argument.rows = parameter.dimensions() == 1 ? 1 : SomeDimension(random, sizes, isUsual);
+        argument.cols = SomeDimension(random, sizes, isUsual);
+        if (parameter.dimensions() == 2) { // what is cubic in the size stays small
+            argument.rows %= 33;
+            argument.cols %= 33;
+        }
+        argument.bytes =
+            SomeElements(random, parameter.element, argument.rows, argument.cols, content);
+    } else if (parameter.kind == Kind::Value || parameter.kind == Kind::Reference) {
+        argument.whole = SomeWhole(random, sizes);
+        argument.real = SomeReal(random, sizes, isUsual);
+        argument.bytes.resize(ElementSize(parameter.element));
+        const auto whole = static_cast<int32_t>(argument.whole);
+        if (parameter.element == "DBL")
+            std::memcpy(argument.bytes.data(), &argument.real, sizeof argument.real);
+        else if (argument.bytes.size() <= sizeof whole)
+            std::memcpy(argument.bytes.data(), &whole, argument.bytes.size());
+        else
+            argument.bytes = SomeElements(random, parameter.element, 1, 1, content);
+    } else if (!parameter.element.empty()) {
+        argument.bytes = SomeElements(random, parameter.element, 1, 1, content);
+    }
+    return argument;
+}
+
+} // namespace
+
+bool Scenario::shares() const {
+    return std::any_of(arguments.begin(), arguments.end(),
+                       [](const Argument &argument) { return argument.aliasOf >= 0; });
+}
+
+Scenario SomeScenario(Random &random, const Thunk &thunk) {
+    const bool isUsual = random.oneIn(2);
+    const Sizes sizes = SomeSizes(random);
+    Scenario scenario{&thunk, {}, {}};
+    const bool shares = random.oneIn(6);
+    for (std::size_t i = 0; i < thunk.parameters.size(); ++i) {
+        const Parameter &parameter = thunk.parameters[i];
+        Argument argument = SomeArgument(random, parameter, sizes, isUsual);
+        if (IsKept(thunk.name, Oddity::TimeFollowsNumber))
+            argument.whole %= 2000;
+        if (shares && parameter.isArray()) {
+            argument.aliasOf = SomeAlias(random, scenario, i);
+            if (argument.aliasOf >= 0) {
+                const int aliasOf = argument.aliasOf;
+                argument = scenario.arguments[static_cast<std::size_t>(aliasOf)];
+                argument.aliasOf = aliasOf;
+            }
+        }
+        scenario.arguments.push_back(std::move(argument));
+    }
+    scenario.disturbance = SomeDisturbance(random);
+    return scenario;
+}
+
+Node::~Node() {
+    for (void *slot : slots)
+        RunSweepOf(slot);
+    if (instance != nullptr && release != nullptr)
+        release(&instance);
+}
+
+Blocks::Blocks(const Scenario &scenario, const Manner &manner) : scenario_(scenario) {
+    for (std::size_t i = 0; i < scenario.arguments.size(); ++i) {
+        const Argument &argument = scenario.arguments[i];
+        void *handle = nullptr;
+        if (parameter(i).isArray() && argument.aliasOf >= 0 && !manner.apart) {
+            handle = handles_[static_cast<std::size_t>(argument.aliasOf)];
+        } else if (parameter(i).isArray()) {
+            handle = newArray(parameter(i), argument, isRead(i) ? nullptr : &manner.rubbish);
+            own_.push_back(handle);
+        }
+        handles_.push_back(handle);
+    }
+}
+
+Blocks::~Blocks() {
+    for (void *handle : own_)
+        detail::FreeBlock(handle);
+}
+
+unsigned char *Blocks::block(std::size_t i) const {
+    return *static_cast<unsigned char **>(handles_[i]);
+}
+
+std::vector<int32_t> Blocks::sizes(std::size_t i) const {
+    std::vector<int32_t> found(static_cast<std::size_t>(parameter(i).dimensions()));
+    std::memcpy(found.data(), block(i), 4 * found.size());
+    return found;
+}
+
+const unsigned char *Blocks::elements(std::size_t i) const {
+    return block(i) + 4 * parameter(i).dimensions();
+}
+
+std::optional<std::size_t> Blocks::bytes(std::size_t i) const {
+    std::size_t count = 1;
+    for (const int32_t size : sizes(i)) {
+        if (size < 0)
+            return std::nullopt;
+        count *= static_cast<std::size_t>(size);
+    }
+    const std::size_t header = 4 * static_cast<std::size_t>(parameter(i).dimensions());
+    const std::size_t size = count * ElementSize(parameter(i).element);
+    if (size > detail::BlockSize(handles_[i]) - header)
+        return std::nullopt;
+    return size;
+}
+
+bool Blocks::isShared(std::size_t i) const {
+    return std::count(handles_.begin(), handles_.end(), handles_[i]) > 1;
+}
+
+bool Blocks::isRead(std::size_t i) const {
+    bool reads = parameter(i).isIn;
+    for (std::size_t other = i + 1; other < scenario_.arguments.size(); ++other)
+        reads |= scenario_.arguments[other].aliasOf == static_cast<int>(i) && parameter(other).isIn;
+    return reads;
+}
+
+void *Blocks::newArray(const Parameter &parameter, const Argument &argument,
+                       const unsigned char *rubbish) {
+    const int32_t rows = parameter.dimensions() == 1 ? argument.cols : argument.rows;
+    void *handle = detail::NewBlock(parameter.dimensions(), TypeCode(parameter.element),
+                                    ElementSize(parameter.element), rows, argument.cols);
+    unsigned char *elements = *static_cast<unsigned char **>(handle) + 4 * parameter.dimensions();
+    if (rubbish != nullptr)
+        std::fill_n(elements, argument.bytes.size(), *rubbish);
+    else if (!argument.bytes.empty())
+        std::memcpy(elements, argument.bytes.data(), argument.bytes.size());
+    return handle;
+}
+
+PreparedCall::PreparedCall(const Scenario &scenario, Node &node, const Manner &manner)
+    : scenario_(scenario), thunk_(*scenario.thunk), blocks_(scenario, manner) {
+    pointed_.resize(thunk_.parameters.size());
+    std::size_t slots = 0;
+    for (std::size_t i = 0; i < thunk_.parameters.size(); ++i) {
+        const Parameter &parameter = thunk_.parameters[i];
+        const Argument &argument = scenario.arguments[i];
+        pointed_[i] = argument.bytes;
+        if (!parameter.isIn)
+            std::fill(pointed_[i].begin(), pointed_[i].end(), manner.rubbish);
+        Value value{pointed_[i].data(), argument.whole, argument.real};
+        if (parameter.isArray())
+            value.pointer = blocks_.handle(i);
+        else if (parameter.kind == Kind::Slot)
+            value.pointer = &node.slots[slots++ % 4];
+        else if (parameter.kind == Kind::Instance)
+            value.pointer = &node.instance;
+        else if (parameter.kind == Kind::Error)
+            value.pointer = &error_;
+        hasError_ |= parameter.kind == Kind::Error;
+        values_.push_back(value);
+    }
+    node.release = thunk_.release;
+}
+
+bool PreparedCall::inputIsUnchanged(std::size_t i) const {
+    const Parameter &parameter = thunk_.parameters[i];
+    if (!parameter.isArray() || parameter.isOut || blocks_.isShared(i) || !sizesFitBlock(i))
+        return true;
+    const std::vector<unsigned char> &before = scenario_.arguments[i].bytes;
+    const unsigned char *elements = blocks_.elements(i);
+    return std::equal(elements, elements + *blocks_.bytes(i), before.begin(), before.end());
+}
+
+std::vector<OutputValue> PreparedCall::outputs() const {
+    std::vector<OutputValue> found;
+    for (std::size_t i = 0; i < thunk_.parameters.size(); ++i) {
+        const Parameter &parameter = thunk_.parameters[i];
+        if (!parameter.isOut || parameter.element.empty() || parameter.kind == Kind::Error)
+            continue;
+        if (parameter.isArray())
+            found.push_back({parameter.name, parameter.element, blocks_.sizes(i),
+                             blocks_.elements(i), blocks_.bytes(i).value_or(0)});
+        else
+            found.push_back(
+                {parameter.name, parameter.element, {}, pointed_[i].data(), pointed_[i].size()});
+    }
+    return found;
+}
+
+namespace {
+
+void Mix(uint64_t &hash, uint64_t word) {
+    hash = (hash ^ word) * 0x9E3779B97F4A7C15U;
+    hash ^= hash >> 29;
+}
+
+template <class Real>
+uint64_t WordOf(const unsigned char *bytes) {
+    Real real;
+    std::memcpy(&real, bytes, sizeof real);
+    uint64_t word = 0;
+    std::memcpy(&word, bytes, sizeof real);
+    return real != real ? 1 : word;
+}
+
+void MixField(uint64_t &hash, const std::string &element, const unsigned char *bytes,
+              std::size_t count) {
+    if (element == "DBL") {
+        for (std::size_t i = 0; i < count; i += 8)
+            Mix(hash, WordOf<double>(bytes + i));
+    } else if (element == "SGL") {
+        for (std::size_t i = 0; i < count; i += 4)
+            Mix(hash, WordOf<float>(bytes + i));
+    } else {
+        for (std::size_t i = 0; i < count; i += 8) {
+            uint64_t word = 0;
+            std::memcpy(&word, bytes + i, std::min<std::size_t>(8, count - i));
+            Mix(hash, word);
+        }
+    }
+}
+
+} // namespace
+
+void ValueHash::add(const OutputValue &value) {
+    for (const int32_t size : value.sizes)
+        Mix(sizes_, static_cast<uint32_t>(size));
+    Mix(sizes_, value.bytes);
+    const auto record = AllRecords().find(value.element);
+    if (record == AllRecords().end()) {
+        MixField(elements_, value.element, value.elements, value.bytes);
+        return;
+    }
+    // By its fields: what is between them is nobody's.
+    const RecordType &type = record->second;
+    for (std::size_t at = 0; at < value.bytes; at += type.size)
+        for (const RecordField &field : type.fields)
+            MixField(elements_, field.element, value.elements + at + field.offset,
+                     field.count * ElementSize(field.element));
+}
+
+const std::vector<Subject> &AllSubjects() {
+    static const std::vector<Subject> all = [] {
+        std::map<std::string, Subject> byName;
+        for (const Thunk &thunk : AllThunks())
+            byName[thunk.name].thunk = &thunk;
+        for (const Recipe &recipe : AllRecipes())
+            byName[recipe.exportName()].recipes.push_back(&recipe);
+        std::vector<Subject> subjects;
+        for (auto &[name, subject] : byName) {
+            subject.name = name;
+            subjects.push_back(std::move(subject));
+        }
+        return subjects;
+    }();
+    return all;
+}
+
+uint64_t SeedOf(uint64_t seed, const std::string &name, int64_t round) {
+    for (const char c : name)
+        seed = seed * 0x100000001B3U + static_cast<unsigned char>(c);
+    return seed * 0x100000001B3U + static_cast<uint64_t>(round);
+}
+
+} // namespace qx::test

@@ -1,0 +1,124 @@
+#ifndef QX_TESTS_FUZZ_SCENARIO_H
+#define QX_TESTS_FUZZ_SCENARIO_H
+
+#include "tests/fuzz/attack.h"
+#include "tests/fuzz/content.h"
+#include "tests/fuzz/thunk.h"
+#include "tests/support/recipe.h"
+
+#include <cstdint>
+#include <optional>
+#include <string>
+#include <vector>
+
+namespace qx::test {
+
+// A call with arguments that come from the catalogue and a random stream alone.
+
+// One argument as it is before a call; blocks are made from it for each run.
+struct Argument {
+    int32_t rows = 0, cols = 0;       // of an array; a 1-D array has cols only
+    std::vector<unsigned char> bytes; // elements of an array, or what a pointer shows
+    int64_t whole = 0;
+    double real = 0;
+    int aliasOf = -1; // the array argument whose handle this one shares
+};
+
+// One call with all that happens around it.
+struct Scenario {
+    const Thunk *thunk;
+    std::vector<Argument> arguments;
+    Disturbance disturbance;
+    bool shares() const;
+};
+Scenario SomeScenario(Random &random, const Thunk &thunk);
+
+// The words that a node keeps between its calls.
+struct Node {
+    void *slots[4] = {};
+    void *instance = nullptr;
+    int32_t (*release)(void **) = nullptr;
+    ~Node();
+};
+
+// How a call is made. The second time what no result may depend on is another: what memory and
+// outputs hold before, and whether arrays share a handle.
+struct Manner {
+    bool apart = false;
+    unsigned char rubbish = 0x17;
+};
+
+// The blocks of the array arguments.
+class Blocks {
+public:
+    Blocks(const Scenario &scenario, const Manner &manner);
+    ~Blocks();
+    Blocks(const Blocks &) = delete;
+    Blocks &operator=(const Blocks &) = delete;
+
+    void *handle(std::size_t i) const { return handles_[i]; }
+    std::vector<int32_t> sizes(std::size_t i) const;
+    const unsigned char *elements(std::size_t i) const;
+    // Of the elements, by the sizes; none where the block has not so many.
+    std::optional<std::size_t> bytes(std::size_t i) const;
+    bool isShared(std::size_t i) const;
+
+private:
+    const Parameter &parameter(std::size_t i) const { return scenario_.thunk->parameters[i]; }
+    unsigned char *block(std::size_t i) const;
+    bool isRead(std::size_t i) const;
+    static void *newArray(const Parameter &parameter, const Argument &argument,
+                          const unsigned char *rubbish);
+
+    const Scenario &scenario_;
+    std::vector<void *> handles_, own_;
+};
+
+// A scenario with its blocks: makes the call and shows what it left.
+class PreparedCall {
+public:
+    PreparedCall(const Scenario &scenario, Node &node, const Manner &manner);
+
+    int32_t operator()() const { return thunk_.call(values_.data()); }
+    ErrorCode status(int32_t functionResult) const {
+        return hasError_ ? error_ : thunk_.returnsCode ? functionResult : 0;
+    }
+    bool sizesFitBlock(std::size_t i) const { return blocks_.bytes(i).has_value(); }
+    bool inputIsUnchanged(std::size_t i) const;
+    // An array whose sizes exceed its block is shown without elements.
+    std::vector<OutputValue> outputs() const;
+
+private:
+    const Scenario &scenario_;
+    const Thunk &thunk_;
+    Blocks blocks_;
+    std::vector<std::vector<unsigned char>> pointed_;
+    std::vector<Value> values_;
+    ErrorCode error_ = 0;
+    bool hasError_ = false;
+};
+
+// A NaN counts as a NaN: its sign and payload are the processor's.
+class ValueHash {
+public:
+    void add(const OutputValue &value);
+    uint64_t sizes() const { return sizes_; }
+    uint64_t elements() const { return elements_; }
+
+private:
+    uint64_t sizes_ = 0x632BE59BD9B4E019U, elements_ = 0x632BE59BD9B4E019U;
+};
+
+// An export with the ways to call it.
+struct Subject {
+    std::string name;
+    const Thunk *thunk = nullptr;
+    std::vector<const Recipe *> recipes;
+};
+const std::vector<Subject> &AllSubjects();
+// Of the case of an export in a round: the same whatever other exports there are.
+uint64_t SeedOf(uint64_t seed, const std::string &name, int64_t round);
+
+} // namespace qx::test
+
+#endif
