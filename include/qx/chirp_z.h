@@ -12,11 +12,12 @@ QX_BEGIN_DECLS
 
 /** out[m] = sum over k from 0 to n-1 of in[k] a^(-k) w^(k m), for m from 0 to count-1; a count
     below 1 means n. method: 0 the direct sum, a complex power for each term; 1 Bluestein's form,
-    one convolution by transforms. Off the unit circle powers with exponents up to n^2 / 2 may
-    leave the range of double in method 1.
+    one convolution by transforms. Off the unit circle |a|^n, |w|^(n count) in method 0 and
+    |w|^((n + count)^2 / 2) in method 1 may leave the range of double; outputs are then infinite or
+    NaN with code 0. Method 0 takes n count powers, as many as the two numbers say.
     Codes: ErrEmptyInput (in is empty), ErrInvalidSelector (no such method), ErrOutOfMemory (the
     host refuses out, or no memory), ErrNonFiniteInput (a, or then w, is not finite),
-    ErrNotStrictlyPositive (a, or then w, is 0). */
+    ErrTooFewWeights (|a|^2, or then |w|^2, is 0: a number below about 1e-162 counts as 0). */
 QX_API ErrorCode ChirpZT_head(QX_IN DBL1D in, QX_IN const CDB *a, QX_IN const CDB *w, int32_t count,
                               uint32_t method, QX_OUT CDB1D out);
 /** As ChirpZT_head, for complex data. */
@@ -27,10 +28,11 @@ QX_API ErrorCode CxChirpZT_head(QX_IN CDB1D in, QX_IN const CDB *a, QX_IN const 
     points of the input, around the one that is nearest to the unit circle, and gives a sequence
     of that length; below 1 it means n. Costs n^2 complex powers. On the whole circle the relative
     error grows a little faster than n, 5e-12 for 512 values; on an arc or off the circle it grows
-    exponentially with n.
+    exponentially with n, and powers that leave the range of double make values infinite or NaN with
+    code 0.
     Codes: ErrEmptyInput (in is empty), ErrSizesDisagree (count is above n), ErrOutOfMemory (the
     host refuses out, or no memory), ErrNonFiniteInput (a, or then w, is not finite),
-    ErrNotStrictlyPositive (a, or then w, is 0), ErrDegenerateValue (1/a is 0, or two points agree
+    ErrTooFewWeights (|a|^2, or then |w|^2, is 0), ErrDegenerateValue (1/a is 0, or two points agree
     to rounding). */
 QX_API ErrorCode InvChirpZT_head(QX_IN CDB1D in, QX_IN const CDB *a, QX_IN const CDB *w,
                                  int32_t count, QX_OUT CDB1D out);

@@ -47,7 +47,8 @@ QX_API ErrorCode InvDST_1DH_IDP(QX_IN DBL1D in, QX_OUT DBL1D out, QX_INOUT Insta
 
 /** As DCT_1DH, of all rows, then of all columns, of the upper left rows by cols values (those of
     the input where below 1; zeros beyond it). slotA keeps the plan of the columns, slotB that of
-    the rows.
+    the rows. Memory is as large as rows and cols say, however small `in` is; a rows cols above 2^31
+    - 1 is refused before any is taken.
     Codes: ErrEmptyInput (in is empty), ErrOutOfMemory (no memory), the host's status. Every failure
     empties out. */
 QX_API ErrorCode DCT_2DH(QX_IN DBL2D in, QX_OUT DBL2D out, int32_t rows, int32_t cols,

@@ -14,7 +14,9 @@ QX_BEGIN_DECLS
     u of x[u] exp(-2 pi i u (start + i) / L) for i from 0 to size-1, cyclic in frequency. An input
     shorter than L is zero-padded. A longer one is folded, in place: its elements from index N on
     (not from L) are added, one after the other, to elements 0 to L-1 over and over. Costs a
-    transform of length N and `size` rotations for each of min(S, elements of x) sub-sequences.
+    transform of length N and `size` rotations for each of min(S, elements of x) sub-sequences, and
+    beside `out` the plan of length N (see create_oxfft_table) and work memory of 16 N bytes or
+    more, 32 N of complex data: N is the caller's, and all this is taken however short the input is.
     Codes: ErrOrderNotPositive (S below 1), ErrFFTSizeNotPositive (size or N below 1),
     ErrOutOfMemory (no memory), the host's status, ErrLengthTooLarge (an index would pass int32). A
     negative status empties out. An empty input gives an empty output and 0. */

@@ -12,7 +12,9 @@ QX_BEGIN_DECLS
 /** X[r][c] = sum over a and b of x[a][b] exp(-2 pi i (r a / rows + c b / cols)), with x the rows by
     cols values of `in` from (rowStart, colStart) on, padded with zeros behind its ends; shift
     concerns both dimensions. Unscaled. slotCols keeps the plan of length cols, slotRows that of
-    length rows.
+    length rows. Plans and output are as large as rows and cols say, however small `in` is; a rows
+    cols above 2^31 - 1 is refused before any memory is taken, a negative start last, when the host
+    has given the output.
     Codes: ErrEmptyInput (in is empty), ErrIndexOutOfRange (a start behind the end),
     ErrSizesDisagree (rows or cols below 1), ErrOutOfMemory (no memory), the host's status,
     ErrIndexOutOfRange (a negative start). */

@@ -31,16 +31,22 @@ typedef struct RemezBand {
 /* An array of RemezBand: a one-dimensional block of records. */
 typedef QX_ARRAY_1D(RemezBand) RemezBand1D;
 
-/** An equiripple filter of n taps: the one whose greatest weighted deviation over the bands is the
-    least, which is *ripple. type: 0 a filter with symmetric taps and bands from 0 to fs / 2; 1 a
+/** An equiripple filter of n taps: the one whose greatest weighted deviation on a grid of the bands
+    is the least, which is *ripple. The grid has 16 points for each extremum. Between its points the
+    deviation is larger: of 4500 random designs up to 99 by 4 % in a hundred lowpass and bandpass
+    filters, 11 % in a hundred differentiators, 30 % at most, where n is small; and by any factor
+    over a band narrower than 1 / (16 n) of the sampling rate, of which only the edges are on the
+    grid. Where the bands leave much of the axis free, above all in Hilbert transformers that end
+    far below fs / 2, taps may be large and cancel (above 1e10 in one of a hundred), and the
+    response is lost in their rounding while *ripple is small: look at the largest tap. type: 0 a filter with symmetric taps and bands from 0 to fs / 2; 1 a
     differentiator and 2 a Hilbert transformer, with antisymmetric taps, h[n - 1 - i] = -h[i]. A
     differentiator begins at 0, a Hilbert transformer above; both end at fs / 2 with an even n and
-    below it with an odd one. maxIterations not above 0 means 100. Where the iterations run out
+    below it with an odd one. maxIterations not above 0 means 100; each takes time as n^2. Where the iterations run out
     *ripple has the last deviation, after any other failure it is NaN. After McClellan, Parks and
     Rabiner, "A computer program for designing optimum FIR linear phase digital filters", 1973.
     Codes: ErrBadDesignField (a number that is not finite, n below 3, no such type, a first or last
-    edge that does not suit the type, or an exchange that loses, meets itself or does not settle in
-    time), ErrOrderNotPositive (n is below 1), ErrBadCutoff (no band, fs or a weight is not above 0,
+    edge that does not suit the type, a weight that vanishes in double when it is multiplied for the
+    symmetry of the taps, or an exchange that loses, meets itself or does not settle in time), ErrOrderNotPositive (n is below 1), ErrBadCutoff (no band, fs or a weight is not above 0,
     an edge or a desired value is negative, or the edges do not rise), ErrOutOfMemory (the host
     refuses h, whose status is then the function result; or no memory or more than about 4090 taps,
     then the function result is 2), ErrAboveNyquist (the last edge is above fs / 2), ErrBadTapCount
@@ -76,7 +82,8 @@ QX_API int32_t FIRNarrowCoef_head(QX_IN const double *fs, QX_IN const double *fP
 
 /** x through a filter of FIRNarrowCoef_head. y is the full convolution, of size of x + (size of
     model - 1) M + size of interpolator - 1 values, or size of x + size of model - 1 for M below 2;
-    the filter delays by half of what is added.
+    the filter delays by half of what is added. Memory and time are those of y, and so of M, however
+    short x is.
     Codes: ErrEmptyInput (x is empty, and then y stays as it is; or the model or, for M above 1, the
     interpolator), ErrOutOfMemory (the host refuses y; its status is the function result; or no
     memory). */

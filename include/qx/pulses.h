@@ -73,7 +73,8 @@ QX_API ErrorCode StateLevels_IDP(QX_IN DBL1D y, double t0, double dt, int32_t me
     ErrMeasureBadCount (pulseNumber below 1), ErrMeasureEmpty (y is empty),
     ErrMeasureLevelsReversed (dt is not above 0), ErrInvalidSelector (limit or polarity is neither 0
     nor 1), ErrMeasureNotPositive (no amplitude, as in StateLevels), ErrMeasureRangeReversed (the
-    references are out of order), ErrMeasureOutOfMemory (no memory for so many crossings),
+    references are out of order), ErrMeasureOutOfMemory (no memory for
+    the crossings, at most as many as y has samples; or pulseNumber above about 8e7),
     ErrMeasureSearchShort (too few crossings), WarnMeasurePartial (as in StateLevels). */
 QX_API ErrorCode PulseMeasEx(QX_IN DBL1D y, double t0, double dt, uint16_t polarity,
                              uint16_t partial, int32_t pulseNumber,
@@ -111,7 +112,7 @@ QX_API ErrorCode PulseMeas(QX_IN DBL1D y, double t0, double dt, uint16_t polarit
    ErrMeasureLevelsReversed (dt is not above 0), ErrInvalidSelector (limit or polarity is neither 0
    nor 1), ErrMeasureNotPositive (no amplitude, as in StateLevels and for peaks as well),
    ErrMeasureRangeReversed (the references are out of order), ErrMeasureOutOfMemory (no memory for
-   so many transitions), ErrMeasureTooFewPoints (there is no such transition), ErrMeasureOutOfRange
+   the transitions, at most as many as y has samples; or number above about 3e7), ErrMeasureTooFewPoints (there is no such transition), ErrMeasureOutOfRange
    (the duration is not above 0), WarnMeasurePartial (as in StateLevels, for peaks as well). */
 QX_API ErrorCode TransMeas(QX_IN DBL1D y, double t0, double dt, uint16_t polarity, int32_t number,
                            QX_INOUT ReferenceLevels *ref, QX_IN const HistogramOptions *hist,

@@ -16,10 +16,11 @@ QX_BEGIN_DECLS
     derivative at the centre over i factorial. Weights count by their absolute values; without any,
     all samples count alike. The fit goes through the inverse of the triangular factor of the powers
     of t, which is refused where its diagonal falls to 2.2e-16 of its largest element: from frames
-    of 3575 samples on at order 5, of 225 at order 8, of 49 at order 12.
+    of 3575 samples on at order 5, of 225 at order 8, of 49 at order 12. Memory grows as frame^2 and
+    time as frame^2 order, by these two numbers alone.
     Codes: ErrBadCoefficients (order is below 1), ErrPolynomialOrderTooHigh (frame is not above
     order), ErrSizeMismatch (weights are there, but not as many as the frame has samples),
-    ErrOutOfMemory (no memory, or the host refuses an output), ErrBadTapCount (frame is even),
+    ErrBadTapCount (frame is even), ErrOutOfMemory (no memory, or the host refuses an output),
     ErrNonFiniteInput (a weight is NaN or infinite, or the powers overflow), ErrSingularMatrix (the
     factor is refused). */
 QX_API ErrorCode SavitzkyGolayCoefH(int32_t order, int32_t frame, QX_IN DBL1D weights,

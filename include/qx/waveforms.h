@@ -9,7 +9,11 @@
    sample n. The patterns make one array that stands for itself.
 
    Exports with an error out-parameter have the function result 0, or the host's status where it
-   refused the resize. All begin with the code ErrEmptyInput (*n is below 1); a failure empties x
+   refused the resize. Nothing is checked for overflow unless it says so: where a product of the
+   formula, such as n 360 f, leaves the range of double, samples and phases are infinite or NaN with
+   code 0, and a shape whose width or bandwidth makes such a product has NaN at its middle, too.
+
+   All begin with the code ErrEmptyInput (*n is below 1); a failure empties x
    and leaves the phase. */
 
 #include "qx/types.h"
@@ -148,8 +152,8 @@ QX_API ErrorCode PeriodicSincH(QX_INOUT DBL1D x, int32_t n, double amp, int32_t 
 
 /** Phase modulation: y[i], in degrees, becomes sin(y[i] pi/180 + *phase dt), where *phase advances
     by 2 pi fc per sample and by a full turn more or less, which the sine does not see: 2 pi/dt is
-    subtracted once *phase reaches it and otherwise added. *peak is the input of largest magnitude
-    so far, by whole parts. *phaseOut is *phase dt in degrees plus the last output. Without samples
+    subtracted once *phase reaches it and otherwise added. A dt of 0, or a phase whose product with dt
+    is not finite, gives NaN. *peak is the input of largest magnitude so far, by whole parts. *phaseOut is *phase dt in degrees plus the last output. Without samples
     the last output counts as 0. The function result is 0. */
 QX_API int32_t PhasMod(int32_t n, double dt, QX_OUT double *phaseOut, double fc,
                        QX_INOUT QX_LENGTH(n) DBL *y, QX_INOUT double *peak, QX_INOUT double *phase);

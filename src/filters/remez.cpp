@@ -124,18 +124,22 @@ double SymmetryFactor(const Bands &bands, bool isOdd, double f) {
     return isOdd ? std::sin(kTwoPi * f) : std::sin(kPi * f);
 }
 
-void DivideByFactor(const Bands &bands, bool isOdd, int32_t nfcns, Grid &grid) {
+// ErrBadDesignField where a weight vanishes: the deviation allowed by it would be no number.
+ErrorCode DivideByFactor(const Bands &bands, bool isOdd, int32_t nfcns, Grid &grid) {
     const bool isZeroAtNyquist = (bands.type == RemezMultiband) != isOdd;
     const double step = 0.5 / (gridDensity * nfcns);
     if (isZeroAtNyquist && grid.frequency[grid.size - 1] > 0.5 - step)
         --grid.size;
     if (bands.type == RemezMultiband && isOdd)
-        return;
+        return 0;
     for (int32_t k = 0; k < grid.size; ++k) {
         const double factor = SymmetryFactor(bands, isOdd, grid.frequency[k]);
         grid.desired[k] = grid.desired[k] / factor;
         grid.weight[k] = grid.weight[k] * factor;
+        if (grid.weight[k] == 0.0)
+            return ErrBadDesignField;
     }
+    return 0;
 }
 
 // The exchange: a polynomial through r alternating deviations at the extrema ext, whose error over
@@ -482,7 +486,8 @@ ErrorCode RemezDesign(int32_t nBands, const DBL *desired, const DBL *weight, dou
     Grid grid;
     if (const ErrorCode failed = LayGrid(bands, nfcns, grid))
         return failed;
-    DivideByFactor(bands, isOdd, nfcns, grid);
+    if (const ErrorCode failed = DivideByFactor(bands, isOdd, nfcns, grid))
+        return failed;
     if (grid.size < 1)
         return ErrBadDesignField;
     Exchange exchange(grid, nfcns);

@@ -166,9 +166,12 @@ public:
     }
     // The host takes the count in int32. A product that wraps there would leave a block that is
     // smaller than its dimensions say, so it is refused as memory that cannot be had.
+    static bool mayHave(int32_t rows, int32_t cols) requires(dimensions == 2) {
+        return int64_t{rows} * cols <= std::numeric_limits<int32_t>::max();
+    }
     Outcome resize(int32_t rows, int32_t cols) requires(dimensions == 2) {
         const int64_t count = int64_t{rows} * cols;
-        if (count > std::numeric_limits<int32_t>::max())
+        if (!mayHave(rows, cols))
             return ErrOutOfMemory;
         const int32_t hostStatus = reshape(code, static_cast<int32_t>(count));
         if (hostStatus == 0)

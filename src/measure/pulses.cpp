@@ -4,6 +4,7 @@
 
 #include <algorithm>
 #include <cmath>
+#include <limits>
 
 namespace qx {
 
@@ -12,14 +13,21 @@ namespace {
 bool IsDirection(int32_t direction) { return direction == falling || direction == rising; }
 
 // A list of `2 number + 1` entries: the period or transition asked for, whichever way the waveform
-// begins, and the entry behind it.
+// begins, and the entry behind it. No two entries lie between the same samples, so the list need not
+// be longer than the waveform.
 template <class Entry>
 class List {
 public:
-    ErrorCode allocate(int32_t number) {
-        const int64_t length = 2 * int64_t{number} + 1;
-        return memory_.allocate(length * int64_t{sizeof(Entry)}) ? ErrMeasureOutOfMemory : 0;
+    ErrorCode allocate(int32_t number, const Waveform &waveform) {
+        constexpr int64_t size = sizeof(Entry);
+        const int64_t wanted = 2 * int64_t{number} + 1;
+        // kept: a list that no scratch block could hold is refused, though it needs none so long.
+        if (wanted * size > std::numeric_limits<int32_t>::max())
+            return ErrMeasureOutOfMemory;
+        length_ = static_cast<int32_t>(std::min<int64_t>(wanted, waveform.n));
+        return memory_.allocate(length_ * size) ? ErrMeasureOutOfMemory : 0;
     }
+    int32_t length() const { return length_; }
     Entry *data() const { return static_cast<Entry *>(memory_.bytes()); }
     const Entry &operator[](int32_t i) const { return data()[i]; }
 
@@ -34,16 +42,17 @@ public:
 
 private:
     ScratchBytes memory_;
+    int32_t length_ = 0;
 };
 
 ErrorCode SelectPulse(const Waveform &waveform, double h, int32_t direction, bool mayBePartial,
                       int32_t number, double mid, PulseFound *found) {
     List<Crossing> list;
-    if (const ErrorCode failed = list.allocate(number))
+    if (const ErrorCode failed = list.allocate(number, waveform))
         return failed;
-    const int32_t wanted = 2 * number + 1; // fits, since the list does
+    const int32_t wanted = 2 * number + 1; // fits, since the list could
     const int32_t count =
-        FindMidCrossings(waveform.t0, waveform.y, waveform.n, mid, h, list.data(), wanted);
+        FindMidCrossings(waveform.t0, waveform.y, waveform.n, mid, h, list.data(), list.length());
     const bool isEnough = count == wanted || (mayBePartial && count == wanted - 1 &&
                                               list[count - 1].direction != direction);
     if (!isEnough)
@@ -244,12 +253,12 @@ ErrorCode MeasureTransition(const Waveform &waveform, const LevelSearch &search,
     if (status < 0)
         return status;
     List<Transition> list;
-    if (const ErrorCode failed = list.allocate(number))
+    if (const ErrorCode failed = list.allocate(number, waveform))
         return failed;
     int32_t count;
     if (const ErrorCode failed =
             FindTransitions(waveform.y, waveform.n, references->low, references->high, list.data(),
-                            2 * number + 1, &count))
+                            list.length(), &count))
         return failed;
     const int32_t place = list.find(number, direction, count);
     if (place == count)

@@ -242,13 +242,15 @@ int32_t BinomialByCounting(RandomStream &stream, int32_t trials, double limit) {
     return std::min(successes, trials);
 }
 
+// A cache that was not kept as the last call left it may promise more successes than trials, or
+// numbers with which none is ever accepted; what can be seen at a glance is made anew.
 void Refresh(BinomialCache &cache, int32_t trials, double q) {
-    if (trials != cache.nOld) {
+    if (trials != cache.nOld || cache.enOld != trials) {
         cache.enOld = trials;
         cache.lnGammaEn1 = LnGammaFunction(trials + 1.0);
         cache.nOld = trials;
     }
-    if (q != cache.pOld) {
+    if (q != cache.pOld || cache.pc != 1.0 - q) {
         cache.pc = 1.0 - q;
         cache.logP = std::log(q);
         cache.logPc = std::log(cache.pc);

@@ -52,7 +52,7 @@ ErrorCode CheckSpiral(const CDB &a, const CDB &w) {
         if (!IsFinite(z))
             return ErrNonFiniteInput;
         if (Square(z) == 0.0)
-            return ErrNotStrictlyPositive;
+            return ErrTooFewWeights;
     }
     return 0;
 }

@@ -11,7 +11,7 @@ namespace qx {
 // The z-transform of n values on a spiral of `count` points, X[m] = sum over k of x[k] a^(-k)
 // w^(k m). A power z^p is exp(i p arg z) times (|z|^2)^(p/2).
 //
-// ErrNonFiniteInput (a), ErrNotStrictlyPositive (a is 0), the same two of w, ErrOutOfMemory.
+// ErrNonFiniteInput (a), ErrTooFewWeights (a is 0), the same two of w, ErrOutOfMemory.
 enum ChirpMethod : uint32_t {
     DirectSum = 0, // n count powers
     Bluestein = 1, // one convolution by transforms, n + count powers

@@ -38,6 +38,8 @@ Outcome Forward(In<Matrix> in, int32_t rowStart, int32_t colStart, int32_t rows,
     const MatrixRegion region{in.rows(), in.cols(), rowStart, colStart, rows, cols};
     if (const ErrorCode failed = CheckRegion(region))
         return failed;
+    if (!out.mayHave(rows, cols)) // before plans of these lengths are built
+        return ErrOutOfMemory;
     if (const ErrorCode failed = AcquirePlans(keep, rows, cols))
         return failed;
     if (const Outcome bad = out.resize(rows, cols))

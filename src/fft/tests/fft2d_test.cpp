@@ -2,6 +2,7 @@
 #include "qx/errors.h"
 #include "qx/fft2d.h"
 #include "qx/frame.h"
+#include "tests/support/heap_probe.h"
 #include "tests/support/hostile_host.h"
 #include "tests/support/transform_reference.h"
 
@@ -14,6 +15,7 @@ namespace {
 using qx::test::CDBMatrix;
 using qx::test::DBLMatrix;
 using qx::test::Dft;
+using qx::test::HeapProbe;
 using qx::test::Host;
 using qx::test::LongSpectrum;
 using qx::test::MaxError;
@@ -263,6 +265,15 @@ TEST(TwoDimensional, RequestsBeyondMemoryEndInACode) {
                   0);
         EXPECT_EQ(out.rows(), 0);
     }
+    if (!HeapProbe::works())
+        GTEST_SKIP();
+    const CDBMatrix out(1, 1);
+    Node fresh;
+    const HeapProbe probe;
+    EXPECT_EQ(ReFFT2D_H(real.handle(), 0, 0, 46341, 46341, 0, out.handle(), &fresh.slot,
+                        &fresh.second),
+              ErrOutOfMemory);
+    EXPECT_EQ(probe.allocations(), 0) << "plans of lengths that no output can have";
 }
 
 } // namespace

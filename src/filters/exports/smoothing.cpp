@@ -21,6 +21,8 @@ Outcome FitMatrices(int32_t order, int32_t frame, In<DBL1D> weights, bool wantsD
                     Out<DBL2D> smoothing, Out<DBL2D> differentiators) {
     if (const ErrorCode failed = CheckFit(order, frame, weights))
         return failed;
+    if (frame % 2 == 0) // before the host is asked for frame^2 values
+        return ErrBadTapCount;
     if (const Outcome bad = smoothing.resize(frame, frame))
         return bad;
     if (wantsDifferentiators)

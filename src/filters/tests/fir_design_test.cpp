@@ -270,6 +270,9 @@ TEST(Parks, TellsWhatCannotBeInOrder) {
         {{9, 3, {pass, stop}}, ErrBadDesignField},
         {{41, 0, {{1, 0, 0.0001, 1}, {0, 0.4999, 0.5, 1}}}, ErrBadDesignField},
         {{3, 2, {{1, 0.48, 0.49, 1}}}, ErrBadDesignField},
+        // Weights that vanish with the factor of the symmetry.
+        {{12, 0, {pass, {0, 0.3, 0.5, 5e-324}}}, ErrBadDesignField},
+        {{11, 2, {{1, 0.05, 0.45, 5e-324}}}, ErrBadDesignField},
     };
     for (std::size_t i = 0; i < std::size(cases); ++i) {
         Equiripple design = cases[i].design;

@@ -353,6 +353,21 @@ TEST(IIRDesign, TellsWhatCannotBeInOrder) {
         EXPECT_EQ(cascade.err, code) << design.family << " " << design.order << " " << design.type;
         EXPECT_TRUE(cascade.a.empty() && cascade.b.empty());
     }
+    // Powers that are 0 or infinite are none either.
+    const auto isLost = [](const Design &design) {
+        const Cascade cascade = Designed(design);
+        EXPECT_EQ(cascade.err, 0);
+        return std::isnan(cascade.a[0] + cascade.b[0]);
+    };
+    for (const double ripple : {4e-16, 3083.0, 1e9})
+        EXPECT_TRUE(isLost({Chebyshev, 2, Lowpass, 0.1, 0.2, ripple})) << ripple;
+    for (const double ripple : {5e-16, 3082.0})
+        EXPECT_FALSE(isLost({Chebyshev, 2, Lowpass, 0.1, 0.2, ripple})) << ripple;
+    for (const double attenuation : {4e-16, 5242.0})
+        EXPECT_TRUE(isLost({InvChebyshev, 2, Lowpass, 0.1, 0.2, 1, attenuation})) << attenuation;
+    EXPECT_TRUE(isLost({Elliptic, 2, Lowpass, 0.1, 0.2, 8e-193, 40}));
+    EXPECT_TRUE(isLost({Elliptic, 2, Lowpass, 0.1, 0.2, 1, 3083}));
+    EXPECT_FALSE(isLost({Elliptic, 2, Lowpass, 0.1, 0.2, 1, 3082}));
     // The edge of a band may be half the sampling rate; NaN is no error.
     EXPECT_EQ(Designed({BW, 3, Bandpass, 0.1, 0.5}).err, 0);
     for (int family = BW; family <= Bessel; ++family)

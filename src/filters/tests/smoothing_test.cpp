@@ -179,6 +179,10 @@ TEST(SavitzkyGolay, Failures) {
         EXPECT_EQ(run(1, 3, zeros), ErrSingularMatrix);
         EXPECT_EQ(run(1, 3, notFinite), ErrNonFiniteInput);
     }
+    qx::test::ResetHost();
+    EXPECT_EQ(coefficients(2, 46340, none), ErrBadTapCount);
+    for (const qx::test::Reshape &reshape : qx::test::Host().reshapes)
+        EXPECT_EQ(reshape.count, 0) << "no memory is asked of the host for what is refused";
     EXPECT_EQ(filter(2, 5, none), ErrSizesDisagree);
     EXPECT_EQ(y.size() + smoothing.rows() + differentiators.rows(), 0);
     // Powers that depend on each other in double precision.

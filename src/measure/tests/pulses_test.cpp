@@ -443,6 +443,21 @@ TEST(Pulses, ReferencesMayBeAbsolute) {
 }
 
 // The waveform of every test in two states with noise: the measured errors follow the noise.
+// Memory follows the samples and not the number asked for.
+TEST(Pulses, AreSearchedInAListNoLongerThanTheWaveform) {
+    if (!HeapProbe::works())
+        GTEST_SKIP();
+    const Samples y = Sampled(60, Trapezoids{10, 4, 21, 10, 50});
+    Node node;
+    node.ref = {0.8, 0.25, 0.2, 0};
+    node.hist = {QXLevelsByPeaks, 10};
+    const HeapProbe probe(0, 100000);
+    EXPECT_EQ(node.pulse(y, 1, 1 << 24).status, ErrMeasureSearchShort);
+    EXPECT_EQ(node.cycle(y, 1 << 24).status, ErrMeasureSearchShort);
+    EXPECT_EQ(node.transition(y, 1, 1 << 24).status, ErrMeasureTooFewPoints);
+    EXPECT_EQ(node.pulse(y, 1, 1, 1).status, 0);
+}
+
 TEST(Pulses, StandNoise) {
     Noise noise(11);
     Samples y = Sampled(3000, Trapezoids{40, 20, 80, 20, 200});

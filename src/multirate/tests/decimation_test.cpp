@@ -518,6 +518,14 @@ TEST(Decimation, ModulatorsShiftAStreamInFrequency) {
     EXPECT_TRUE(SameBits(Get(y), Get(r)));
     EXPECT_EQ(ReComplexModulatorH(none.handle(), 1, 10, &phase, y.handle()), 0);
     EXPECT_EQ(y.size(), 3);
+    // No rate, or one too small for the ratio, ends the stream without a code.
+    for (const double frequency : {0.0, 1.0, 1e300}) {
+        phase = 0;
+        const double rate = frequency > 1 ? 1e-300 : 0.0;
+        EXPECT_EQ(ReComplexModulatorH(r.handle(), frequency, rate, &phase, y.handle()), 0);
+        EXPECT_EQ(y.data()[0].re, r.data()[0]);
+        EXPECT_TRUE(std::isnan(y.data()[1].re) && std::isnan(phase));
+    }
 }
 
 } // namespace

@@ -103,6 +103,27 @@ TEST(UniformNumbers, SeedsFillTheState) {
     EXPECT_EQ(state.s2, 2 * 16384 - 3 * 8191);
 }
 
+TEST(UniformNumbers, SeedsMakeStreamsThatDependOnEachOther) {
+    RandomState state = {};
+    const auto numbers = [&](int32_t seed) { return White(30300, seed, state); };
+    const Samples few = numbers(3 * 16384);
+    for (std::size_t i = 0; i < few.size(); ++i) {
+        const double multiple = (few[i] + 0.5) * 30269;
+        ASSERT_NEAR(multiple, std::round(multiple), 1e-10);
+        if (i >= 30268)
+            ASSERT_EQ(few[i], few[i - 30268]);
+    }
+    for (const int32_t seed : {7, 8191, 1000003}) {
+        const Samples once = numbers(seed), twice = numbers(2 * seed);
+        for (std::size_t i = 0; i < once.size(); ++i) {
+            const double distance = twice[i] + 0.5 - 2 * (once[i] + 0.5);
+            ASSERT_NEAR(distance, std::round(distance), 1e-14) << seed;
+        }
+    }
+    for (int32_t k = 1; k <= 4; ++k)
+        EXPECT_EQ(numbers(k * 47333376)[1], -0.5);
+}
+
 // What is drawn in blocks is what is drawn singly, also from states that wrap in the first product
 // and stay negative, lie beyond the moduli or are 0 in part.
 TEST(UniformNumbers, BlocksAndSkipsAreTheSingleNumbers) {
@@ -390,6 +411,12 @@ TEST(Noises, BinomialRefreshesItsCache) {
     }
     EXPECT_EQ(shared.nOld, 90);
     EXPECT_EQ(shared.pOld, 1.0 - 0.7);
+    // One that was not kept as it was: the number of trials stands in it twice.
+    BinomialCache fresh = {};
+    const Samples x = Binomial(100, 100, 0.3, 8, state, fresh);
+    BinomialCache strange = fresh;
+    strange.enOld = 200;
+    EXPECT_EQ(Binomial(100, 100, 0.3, 8, state, strange), x);
 }
 
 // The transform by its definition: every harmonic has the amplitude and the angle drawn for it.

@@ -83,6 +83,8 @@ Outcome Forward2D(In<DBL2D> in, Out<DBL2D> out, int32_t rows, int32_t cols, Keep
         return ErrEmptyInput;
     rows = rows < 1 ? in.rows() : rows;
     cols = cols < 1 ? in.cols() : cols;
+    if (!out.mayHave(rows, cols)) // before memory is taken for so many values
+        return ErrOutOfMemory;
     MatrixWindow window;
     if (const ErrorCode failed = window.take(in.data(), in.rows(), in.cols(), rows, cols))
         return failed;

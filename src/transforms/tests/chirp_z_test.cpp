@@ -183,10 +183,10 @@ TEST(ChirpZ, ChecksComeInOrderAndEmptyTheOutput) {
     };
     EXPECT_EQ(forward(none, zero, zero, 2), ErrEmptyInput);
     EXPECT_EQ(forward(x, zero, zero, 2), ErrInvalidSelector);
-    EXPECT_EQ(forward(x, zero, broken, 1), ErrNotStrictlyPositive);
+    EXPECT_EQ(forward(x, zero, broken, 1), ErrTooFewWeights);
     EXPECT_EQ(forward(x, endless, zero, 0), ErrNonFiniteInput);
     EXPECT_EQ(forward(x, one, broken, 0), ErrNonFiniteInput);
-    EXPECT_EQ(forward(x, one, zero, 1), ErrNotStrictlyPositive);
+    EXPECT_EQ(forward(x, one, zero, 1), ErrTooFewWeights);
     const auto inverse = [&](const CDBArray &in, const CDB &a, const CDB &w, int32_t count) {
         const CDBArray out(2);
         const ErrorCode status = InvChirpZT_head(in.handle(), &a, &w, count, out.handle());
@@ -196,7 +196,7 @@ TEST(ChirpZ, ChecksComeInOrderAndEmptyTheOutput) {
     EXPECT_EQ(inverse(noneComplex, zero, zero, 9), ErrEmptyInput);
     EXPECT_EQ(inverse(z, zero, zero, 6), ErrSizesDisagree);
     EXPECT_EQ(inverse(z, broken, zero, 5), ErrNonFiniteInput);
-    EXPECT_EQ(inverse(z, one, zero, 5), ErrNotStrictlyPositive);
+    EXPECT_EQ(inverse(z, one, zero, 5), ErrTooFewWeights);
     EXPECT_EQ(inverse(z, one, one, 2), ErrDegenerateValue);
     EXPECT_EQ(inverse(z, one, i, 5), ErrDegenerateValue) << "the fifth point is the first";
 }

@@ -395,6 +395,13 @@ TEST(DCTDST, RequestsBeyondMemoryEndInACode) {
             family.forward2D(matrix.handle(), out2.handle(), most, most, &node.slot, &node.second),
             0);
         EXPECT_EQ(out2.rows(), 0);
+        if (HeapProbe::works()) {
+            const HeapProbe probe;
+            EXPECT_EQ(family.forward2D(matrix.handle(), out2.handle(), 46341, 46341, &node.slot,
+                                       &node.second),
+                      ErrOutOfMemory);
+            EXPECT_EQ(probe.allocations(), 0) << "values that no output can have";
+        }
     }
 }
 

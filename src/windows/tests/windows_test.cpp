@@ -191,6 +191,29 @@ TEST(Windows, TheKaiserSeriesIsCutShortWhereItAlwaysWas) {
     EXPECT_NEAR(edge(100.0) * static_cast<double>(series(100, 25)), 1.0, 1e-15);
 }
 
+// A step of the formula that leaves the range of double is no failure.
+TEST(Windows, ParametersBeyondTheRangeOfDoubleGiveNaN) {
+    const auto isNaN = [](double w) { return std::isnan(w); };
+    const auto count = [&](const std::function<ErrorCode(DBL1D)> &apply) {
+        const Values w = WindowOf(16, apply);
+        return std::count_if(w.begin(), w.end(), isNaN);
+    };
+    for (const double sign : {1.0, -1.0}) {
+        EXPECT_EQ(count([=](DBL1D x) { return KaiserH(x, sign * 1e7); }), 0);
+        EXPECT_GT(count([=](DBL1D x) { return KaiserH(x, sign * 4e7); }), 0);
+        EXPECT_GT(count([=](DBL1D x) { return AllWinH(x, 60, sign * 2e9, 0, 0); }), 0);
+    }
+    for (const int32_t symmetric : {0, 1}) {
+        EXPECT_EQ(count([=](DBL1D x) { return DolChebyWinH(x, 1.3e154, symmetric); }), 0);
+        EXPECT_EQ(count([=](DBL1D x) { return DolChebyWinH(x, 1.4e154, symmetric); }), 16);
+    }
+    EXPECT_EQ(count([](DBL1D x) { return AllWinH(x, 61, 3083.0, 0, 0); }), 16);
+    EXPECT_EQ(count([](DBL1D x) { return GaussWinH(x, 4e-156, 0); }), 0);
+    const Values gauss = WindowOf(16, [](DBL1D x) { return GaussWinH(x, 1e-160, 0); });
+    EXPECT_TRUE(std::isnan(gauss[8]));
+    EXPECT_EQ(gauss[7] + gauss[9], 0.0);
+}
+
 TEST(Windows, TapersAndCutsEndWhereTheyShould) {
     const auto taper = [](int n, double ratio) {
         return WindowOf(n, [=](DBL1D x) { return CosTaperedH(x, ratio); });
