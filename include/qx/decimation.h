@@ -39,10 +39,11 @@ QX_API ErrorCode CxDecimateContinuous_H(QX_INOUT CDB1D x, int32_t factor, int32_
                                         QX_INOUT int32_t *partialCount, QX_INOUT CDB *partialSum);
 
 /** Filters a stream with taps that stand L samples apart: y[i] = gain sum over k of h[k] x[i - k
-   L]. state has (size of h - 1) L elements, however short x is. The first *delay outputs are
-   dropped. Codes: ErrOrderNotPositive (h is empty), ErrNotStrictlyPositive (L below 1), ErrMultirateStateSize
-   (state has another size, without reset), the host's status (it refuses the state), ErrOutOfMemory
-   (no memory). */
+    L]. state has (size of h - 1) L elements, however short x is. The first *delay outputs are
+    dropped.
+    Codes: ErrOrderNotPositive (h is empty), ErrNotStrictlyPositive (L below 1),
+    ErrMultirateStateSize (state has another size, without reset), the host's status (it refuses the
+    state), ErrOutOfMemory (no memory). */
 QX_API ErrorCode InterpolatedFIRH(QX_IN DBL1D x, QX_OUT DBL1D y, int32_t L, double gain,
                                   QX_IN DBL1D h, QX_INOUT DBL1D state, uint8_t reset,
                                   QX_INOUT int32_t *delay);
@@ -64,16 +65,16 @@ QX_API ErrorCode DecimatorFIRH(QX_IN DBL1D x, QX_OUT DBL1D y, double gain, int32
                                QX_INOUT DBL1D state, uint8_t reset, int32_t firstPhase,
                                QX_INOUT int32_t *delay);
 
-/** Decimates a stream by `factor` behind a cascade of `stages` moving averages over
-    w = factor differentialDelay samples, which equals a cascaded integrator-comb filter of unit
-   gain at zero frequency, or with `alternate` at half the sampling rate, where a stage is (the
-   running value v becoming) x[i] - v - x[i - w] for even and x[i] - v + x[i - w] for odd w. Running
-   values are plain sums: of data that are not whole numbers they gather rounding errors. state has
-    (w + 1) stages + 1 elements, up to 2^31 - 1, which are cleared by a reset and passed over by
-    every call, however short x is. The first output is that of input *delay.
+/** Decimates a stream by `factor` behind a cascade of `stages` moving averages over w = factor
+    differentialDelay samples, which equals a cascaded integrator-comb filter of unit gain at zero
+    frequency, or with `alternate` at half the sampling rate, where a stage is (the running value v
+    becoming) x[i] - v - x[i - w] for even and x[i] - v + x[i - w] for odd w. Running values are
+    plain sums: of data that are not whole numbers they gather rounding errors. state has (w + 1)
+    stages + 1 elements, up to 2^31 - 1, which are cleared by a reset and passed over by every call,
+    however short x is. The first output is that of input *delay.
     Codes: ErrNotStrictlyPositive (stages, factor or differentialDelay below 1),
-    ErrMultirateStateSize (state has another size, without reset), the host's
-    status (it refuses the state), ErrOutOfMemory (no memory), WarnMultirateEmpty (x is empty). */
+    ErrMultirateStateSize (state has another size, without reset), the host's status (it refuses the
+    state), ErrOutOfMemory (no memory), WarnMultirateEmpty (x is empty). */
 QX_API ErrorCode CICDecimatorByMovH(QX_IN DBL1D x, QX_OUT DBL1D y, QX_INOUT DBL1D state,
                                     int32_t stages, int32_t factor, int32_t differentialDelay,
                                     int16_t alternate, uint8_t reset, QX_INOUT int32_t *delay);
@@ -81,8 +82,8 @@ QX_API ErrorCode CICDecimatorByMovH(QX_IN DBL1D x, QX_OUT DBL1D y, QX_INOUT DBL1
     sample, runs through the cascade of CICDecimatorByMovH. state has (w + 1) stages elements, with
     the same cost. The first *delay outputs are dropped.
     Codes: ErrNotStrictlyPositive (stages, factor or differentialDelay below 1),
-    ErrMultirateStateSize (state has another size, without reset), the host's
-    status (it refuses the state), ErrOutOfMemory (no memory), WarnMultirateEmpty (x is empty). */
+    ErrMultirateStateSize (state has another size, without reset), the host's status (it refuses the
+    state), ErrOutOfMemory (no memory), WarnMultirateEmpty (x is empty). */
 QX_API ErrorCode CICInterpolatorByMovH(QX_IN DBL1D x, QX_OUT DBL1D y, QX_INOUT DBL1D state,
                                        int32_t stages, int32_t factor, int32_t differentialDelay,
                                        int16_t alternate, uint8_t reset, QX_INOUT int32_t *delay);
@@ -103,7 +104,8 @@ QX_API ErrorCode CxDecimatedMovingAverageH(QX_INOUT CDB1D x, int32_t factor, QX_
     scale. The running values stand in sums, the latest inputs of the stages in the rows of buffers,
     the oldest at *position. Where these do not fit the arguments, they are sized and cleared as by
     reset. They have `stages` and stages by width elements, whatever x has; time grows as the
-    elements of x times stages. Nothing happens for stages below 1, and without reset for a width below 2.
+    elements of x times stages. Nothing happens for stages below 1, and without reset for a width
+    below 2.
     Codes: ErrOutOfMemory (no memory). */
 QX_API ErrorCode ReCascadedMovingAverageH(QX_INOUT DBL1D x, int32_t stages, int32_t width,
                                           QX_INOUT DBL1D sums, QX_INOUT DBL2D buffers,
@@ -114,11 +116,11 @@ QX_API ErrorCode CxCascadedMovingAverageH(QX_INOUT CDB1D x, int32_t stages, int3
                                           QX_INOUT int32_t *position, int32_t reset);
 
 /** Shifts a stream in frequency: x[i] becomes x[i] exp(i (*phase + 2 pi i frequency / sampleRate)),
-    and *phase, in radians, that of the next sample, in 0 to 2 pi. A ratio of frequency to rate that is
-    exactly 0 changes neither x nor *phase. A rate of 0, or one so small that the ratio times 2 pi is
-    not finite, makes *phase and all outputs but the first NaN with code 0, and so every later block
-    of the stream. The rotation from sample to sample
-    loses about one rounding error a sample; a ratio far above 1 loses the digits of its fraction.
+    and *phase, in radians, that of the next sample, in 0 to 2 pi. A ratio of frequency to rate that
+    is exactly 0 changes neither x nor *phase. A rate of 0, or one so small that the ratio times 2
+    pi is not finite, makes *phase and all outputs but the first NaN with code 0, and so every later
+    block of the stream. The rotation from sample to sample loses about one rounding error a sample;
+    a ratio far above 1 loses the digits of its fraction.
     Codes: none. */
 QX_API ErrorCode CxComplexModulatorH(QX_INOUT CDB1D x, double frequency, double sampleRate,
                                      QX_INOUT double *phase);

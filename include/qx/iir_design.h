@@ -21,8 +21,8 @@
    one after the other.
 
    Ripple and attenuation are turned into 10^(decibels / 10) - 1. Below 4.8e-16 dB that is 0 and
-   above 3082.5 dB infinite: most coefficients are then NaN with code 0. Of a small ripple r only the
-   digits count that are left in the difference, with a relative error of 1e-15 / r.
+   above 3082.5 dB infinite: most coefficients are then NaN with code 0. Of a small ripple r only
+   the digits count that are left in the difference, with a relative error of 1e-15 / r.
 
    The code is in *err. Where the host refuses an array, the function result is its status. A
    failure empties both arrays. NaN in a frequency, ripple or attenuation makes coefficients NaN. */

@@ -16,8 +16,9 @@
    Where s is odd and its remainder is below 8192, each u of the seed 2 s is the fractional part of
    twice that of s, and the two have a correlation of 0.5. For streams side by side, go on with one
    state, or take states from elsewhere than from seeds.
- The state also advances where a sample needs
-   several draws, so it tells nothing about the number of samples. */
+
+   The state also advances where a sample needs several draws, so it tells nothing about the number
+   of samples. */
 
 #include "qx/types.h"
 
@@ -68,9 +69,9 @@ QX_API int32_t Gauss(QX_OUT DBL1D x, QX_IN const int32_t *n, QX_IN const double 
 
 /** One period of a sum of cosines at 1, 2, ... (n-1)/2 cycles, each of amplitude *amplitude, with
     random phases: noise whose spectrum is flat over whole numbers of periods. The phases are
-    integers from 0 to 32767, taken as radians. Where *n *amplitude overflows all samples are
-    NaN. The code stands in *err and is the function result,
-    which is the host's status instead where it refused the resize.
+    integers from 0 to 32767, taken as radians. Where *n *amplitude overflows all samples are NaN.
+    The code stands in *err and is the function result, which is the host's status instead where it
+    refused the resize.
     Codes: ErrEmptyInput (*n is below 1), ErrOutOfMemory (no memory). */
 QX_API int32_t PeriodNoise(QX_IN const int32_t *n, QX_IN const double *amplitude,
                            QX_IN const int32_t *seed, QX_OUT DBL1D x, QX_OUT ErrorCode *err,
@@ -87,9 +88,9 @@ QX_API ErrorCode GammaNoiseH(QX_OUT DBL1D x, int32_t n, int32_t order, int32_t s
 
 /** Poisson noise: numbers of events, of the given mean. Below a mean of 12 by counting the factors
     of a product of uniform numbers, from there on by rejection from a Lorentzian. A mean that is
-    not finite gives NaN. The rejection loses its digits where the mean is large: the
-    standard deviation comes out 2.5 % too large at a mean of 1e14, 10 % at 1e15, 2.9 times at 1e16,
-    and beyond that the numbers are no Poisson noise, near 1e308 infinite.
+    not finite gives NaN. The rejection loses its digits where the mean is large: the standard
+    deviation comes out 2.5 % too large at a mean of 1e14, 10 % at 1e15, 2.9 times at 1e16, and
+    beyond that the numbers are no Poisson noise, near 1e308 infinite.
     Codes: ErrInvalidSelector (the mean is negative), ErrEmptyInput (n is below 1), ErrOutOfMemory
     (the host refused the resize). */
 QX_API ErrorCode PoissonNoiseH(QX_OUT DBL1D x, int32_t n, double mean, int32_t seed,

@@ -63,19 +63,18 @@ QX_API ErrorCode StateLevels_IDP(QX_IN DBL1D y, double t0, double dt, int32_t me
 /** Pulse number `pulseNumber` (from 1) whose first edge falls (polarity 0) or rises (1): it lies
     between two successive crossings of the mid reference, and a crossing counts once the waveform
     has left the band around mid that reaches to the nearer of the other references. In units of
-    time: the duration, the center, and the period between the crossings of number
-    2 pulseNumber - 1 and 2 pulseNumber + 1 of the waveform; dutyCycle = duration / period. With
-    `partial` the last crossing of the period may be missing; period and dutyCycle are then 0, as
-    they always are with it. Levels are computed only for references in percent, which come out as
-    absolute values.
+    time: the duration, the center, and the period between the crossings of number 2 pulseNumber - 1
+    and 2 pulseNumber + 1 of the waveform; dutyCycle = duration / period. With `partial` the last
+    crossing of the period may be missing; period and dutyCycle are then 0, as they always are with
+    it. Levels are computed only for references in percent, which come out as absolute values.
     Codes: ErrMeasureNullState (a pointer is null), ErrMeasureEmptyChannel (bins below 1),
     ErrMeasureTooManyChannels (unknown method), ErrOutOfMemory (no memory for the counters),
-    ErrMeasureBadCount (pulseNumber below 1), ErrMeasureEmpty (y is empty),
-    ErrMeasureLevelsReversed (dt is not above 0), ErrInvalidSelector (limit or polarity is neither 0
-    nor 1), ErrMeasureNotPositive (no amplitude, as in StateLevels), ErrMeasureRangeReversed (the
-    references are out of order), ErrMeasureOutOfMemory (no memory for
-    the crossings, at most as many as y has samples; or pulseNumber above about 8e7),
-    ErrMeasureSearchShort (too few crossings), WarnMeasurePartial (as in StateLevels). */
+    ErrMeasureBadCount (pulseNumber below 1), ErrMeasureEmpty (y is empty), ErrMeasureLevelsReversed
+    (dt is not above 0), ErrInvalidSelector (limit or polarity is neither 0 nor 1),
+    ErrMeasureNotPositive (no amplitude, as in StateLevels), ErrMeasureRangeReversed (the references
+    are out of order), ErrMeasureOutOfMemory (no memory for the crossings, at most as many as y has
+    samples; or pulseNumber above about 8e7), ErrMeasureSearchShort (too few crossings),
+    WarnMeasurePartial (as in StateLevels). */
 QX_API ErrorCode PulseMeasEx(QX_IN DBL1D y, double t0, double dt, uint16_t polarity,
                              uint16_t partial, int32_t pulseNumber,
                              QX_IN const ReferenceLevels *ref, QX_IN const HistogramOptions *hist,
@@ -104,16 +103,18 @@ QX_API ErrorCode PulseMeas(QX_IN DBL1D y, double t0, double dt, uint16_t polarit
     high reference: start, end and duration in units of time, and slewRate, the difference of the
     references by the duration. Aberrations are the excursions from the state before and behind the
     transition, up to half the way to the neighbouring transitions or to the ends of the waveform,
-   in percent of the amplitude; an overshoot lies above the state's bin of the histogram, an
-   undershoot below it, and inside it there is none. Afterwards `ref` has absolute levels, and its
-   `percent` as it was; a failure leaves it. Codes: ErrMeasureNullState (a pointer is null),
-   ErrMeasureEmptyChannel (bins below 1), ErrMeasureTooManyChannels (unknown method), ErrOutOfMemory
-   (no memory for the counters), ErrMeasureBadCount (number below 1), ErrMeasureEmpty (y is empty),
-   ErrMeasureLevelsReversed (dt is not above 0), ErrInvalidSelector (limit or polarity is neither 0
-   nor 1), ErrMeasureNotPositive (no amplitude, as in StateLevels and for peaks as well),
-   ErrMeasureRangeReversed (the references are out of order), ErrMeasureOutOfMemory (no memory for
-   the transitions, at most as many as y has samples; or number above about 3e7), ErrMeasureTooFewPoints (there is no such transition), ErrMeasureOutOfRange
-   (the duration is not above 0), WarnMeasurePartial (as in StateLevels, for peaks as well). */
+    in percent of the amplitude; an overshoot lies above the state's bin of the histogram, an
+    undershoot below it, and inside it there is none. Afterwards `ref` has absolute levels, and its
+    `percent` as it was; a failure leaves it.
+    Codes: ErrMeasureNullState (a pointer is null), ErrMeasureEmptyChannel (bins below 1),
+    ErrMeasureTooManyChannels (unknown method), ErrOutOfMemory (no memory for the counters),
+    ErrMeasureBadCount (number below 1), ErrMeasureEmpty (y is empty), ErrMeasureLevelsReversed (dt
+    is not above 0), ErrInvalidSelector (limit or polarity is neither 0 nor 1),
+    ErrMeasureNotPositive (no amplitude, as in StateLevels and for peaks as well),
+    ErrMeasureRangeReversed (the references are out of order), ErrMeasureOutOfMemory (no memory for
+    the transitions, at most as many as y has samples; or number above about 3e7),
+    ErrMeasureTooFewPoints (there is no such transition), ErrMeasureOutOfRange (the duration is not
+    above 0), WarnMeasurePartial (as in StateLevels, for peaks as well). */
 QX_API ErrorCode TransMeas(QX_IN DBL1D y, double t0, double dt, uint16_t polarity, int32_t number,
                            QX_INOUT ReferenceLevels *ref, QX_IN const HistogramOptions *hist,
                            QX_INOUT MeasurementSlot *slot, QX_OUT double *slewRate,

@@ -152,9 +152,10 @@ QX_API ErrorCode PeriodicSincH(QX_INOUT DBL1D x, int32_t n, double amp, int32_t 
 
 /** Phase modulation: y[i], in degrees, becomes sin(y[i] pi/180 + *phase dt), where *phase advances
     by 2 pi fc per sample and by a full turn more or less, which the sine does not see: 2 pi/dt is
-    subtracted once *phase reaches it and otherwise added. A dt of 0, or a phase whose product with dt
-    is not finite, gives NaN. *peak is the input of largest magnitude so far, by whole parts. *phaseOut is *phase dt in degrees plus the last output. Without samples
-    the last output counts as 0. The function result is 0. */
+    subtracted once *phase reaches it and otherwise added. A dt of 0, or a phase whose product with
+    dt is not finite, gives NaN. *peak is the input of largest magnitude so far, by whole parts.
+    *phaseOut is *phase dt in degrees plus the last output. Without samples the last output counts
+    as 0. The function result is 0. */
 QX_API int32_t PhasMod(int32_t n, double dt, QX_OUT double *phaseOut, double fc,
                        QX_INOUT QX_LENGTH(n) DBL *y, QX_INOUT double *peak, QX_INOUT double *phase);
 

@@ -8,9 +8,9 @@
 
 QX_BEGIN_DECLS
 
-/** The constants of the window held in an array, measured in one pass. A window whose
-    sum is 0 has an enbw that is infinite, or NaN where all of it is 0; so has one whose sums leave
-    the range of double.
+/** The constants of the window held in an array, measured in one pass. A window whose sum is 0 has
+    an enbw that is infinite, or NaN where all of it is 0; so has one whose sums leave the range of
+    double.
     Codes: ErrEmptyInput (window is empty). Both constants are then NaN. */
 QX_API ErrorCode NumWinConstH(QX_IN DBL1D window, QX_OUT WindowConstants *constants);
 /** The constants of a named window of n samples: stored values for selectors 0 to 9 and 11,

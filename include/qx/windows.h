@@ -43,8 +43,8 @@ typedef struct WindowConstants {
 /** Kaiser window: I0(beta sqrt(1 - u^2)) / I0(beta) with u = 1 - 2i/n. The Bessel series stops
     after 25 terms, so a large beta is cut short: the window is off by 6e-10 at beta 20, by 4e-7 at
     25, by 3e-5 at 30 and by 0.03 at 50. From |beta| about 3e7 on (1e7 is still safe) the sum is
-    infinite and values are NaN. J. F. Kaiser, "Nonrecursive digital filter design
-    using the I0-sinh window function", 1974.
+    infinite and values are NaN. J. F. Kaiser, "Nonrecursive digital filter design using the I0-sinh
+    window function", 1974.
     Codes: ErrEmptyInput (x is empty). */
 QX_API ErrorCode KaiserH(QX_INOUT DBL1D x, double beta);
 /** As KaiserH, for complex samples. */

@@ -13,8 +13,8 @@ namespace {
 bool IsDirection(int32_t direction) { return direction == falling || direction == rising; }
 
 // A list of `2 number + 1` entries: the period or transition asked for, whichever way the waveform
-// begins, and the entry behind it. No two entries lie between the same samples, so the list need not
-// be longer than the waveform.
+// begins, and the entry behind it. No two entries lie between the same samples, so the list need
+// not be longer than the waveform.
 template <class Entry>
 class List {
 public:

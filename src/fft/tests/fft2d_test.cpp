@@ -270,9 +270,9 @@ TEST(TwoDimensional, RequestsBeyondMemoryEndInACode) {
     const CDBMatrix out(1, 1);
     Node fresh;
     const HeapProbe probe;
-    EXPECT_EQ(ReFFT2D_H(real.handle(), 0, 0, 46341, 46341, 0, out.handle(), &fresh.slot,
-                        &fresh.second),
-              ErrOutOfMemory);
+    EXPECT_EQ(
+        ReFFT2D_H(real.handle(), 0, 0, 46341, 46341, 0, out.handle(), &fresh.slot, &fresh.second),
+        ErrOutOfMemory);
     EXPECT_EQ(probe.allocations(), 0) << "plans of lengths that no output can have";
 }
 
