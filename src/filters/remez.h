@@ -11,8 +11,8 @@ namespace qx {
 
 // Equiripple FIR filters with linear phase by the exchange of Remez, after J. H. McClellan, T. W.
 // Parks and L. R. Rabiner, "A computer program for designing optimum FIR linear phase digital
-// filters", 1973: the taps whose greatest weighted deviation from what is desired, over all bands,
-// is the least.
+// filters", 1973: the taps whose greatest weighted deviation from what is desired, on a grid of all
+// bands, is the least.
 
 enum RemezType : int32_t { RemezMultiband = 1, RemezDifferentiator = 2, RemezHilbert = 3 };
 
@@ -22,11 +22,12 @@ enum RemezType : int32_t { RemezMultiband = 1, RemezDifferentiator = 2, RemezHil
 // divided by the frequency). maxIterations not above 0 means 100.
 //
 // ErrBadDesignField: n below 3; a number that is not finite; edges that do not begin or end where
-// the type needs it; or an exchange that loses, has two extrema at one place or does not settle
-// within its rounds, and then *ripple has the last deviation. ErrEmptyInput: no band. ErrBadCutoff:
-// fs or a weight not above 0, a negative edge or gain, edges that do not rise. ErrAboveNyquist.
-// ErrBadTapCount: an even n with a gain at the Nyquist frequency. ErrOutOfMemory: no memory, or
-// about 4090 taps and more, the limit of the design.
+// the type needs it; a weight that vanishes with the factor of the symmetry; or an exchange that
+// loses, has two extrema at one place or does not settle within its rounds, and then *ripple has
+// the last deviation. ErrEmptyInput: no band. ErrBadCutoff: fs or a weight not above 0, a negative
+// edge or gain, edges that do not rise. ErrAboveNyquist. ErrBadTapCount: an even n with a gain at
+// the Nyquist frequency. ErrOutOfMemory: no memory, or about 4090 taps and more, the limit of the
+// design.
 ErrorCode RemezDesign(int32_t nBands, const DBL *desired, const DBL *weight, double fs,
                       const DBL *edges, int32_t type, int32_t n, DBL *h, double *ripple,
                       int32_t maxIterations);
