@@ -9,9 +9,14 @@
        4 left and 5 right rectangles (only where said)
 
    Running integrals and derivatives become an array of the samples' length, in place. Those that
-   look beyond the ends of the data take the samples there from `initial` and `final`: x[-1] is the
-   last of `initial`, x[n] the first of `final`. M. Abramowitz and I. A. Stegun, "Handbook of
-   mathematical functions", 1964, chapter 25, has the rules. */
+   look beyond the ends of the data take the samples there from `initial` and `final`. Of a longer
+   array the first elements count: where one initial value is needed, initial[0] is x[-1], where two
+   are, initial[0] is x[-2] and initial[1] is x[-1]; final[0] is x[n] and final[1] is x[n+1].
+   M. Abramowitz and I. A. Stegun, "Handbook of mathematical functions", 1964, chapter 25, has the
+   rules.
+
+   Values are not watched for overflow: sums of samples near the end of the range, and quotients by a
+   step near 0, become infinite or NaN with the code 0. */
 
 #include "qx/types.h"
 
@@ -112,7 +117,8 @@ QX_API int32_t Derivative(QX_INOUT DBL1D x, QX_IN const double *initial, QX_IN c
         3  (x[i] - x[i-1]) / dt                                        one initial
 
     Codes: ErrEmptyInput (x is empty), ErrSamplingNotPositive (*dt is 0 or below), ErrEmptyInput
-   (too few values beyond the data), ErrInvalidSelector (the rule is another). */
+    (rules 0, 2 and 3: a value is missing), ErrFewerThanTwo (rule 1: one of two values is missing),
+    ErrInvalidSelector (the rule is another). */
 QX_API ErrorCode Derivative85(QX_INOUT DBL1D x, QX_IN DBL1D initial, QX_IN DBL1D final,
                               QX_IN const double *dt, int32_t rule);
 

@@ -150,7 +150,7 @@ ErrorCode Iterate(const ModelFrame &frame, const BoundedFit &request, const FitS
     if (const ErrorCode failed = Pass(frame, samples, request.method, request.bounds, tolerance,
                                       &second, request.p, request.mse))
         return failed;
-    *request.iterations = first + second;
+    *request.iterations = StepsOfBoth(first, second);
     return 0;
 }
 

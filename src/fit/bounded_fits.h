@@ -3,6 +3,8 @@
 
 #include "fit/bounded_lm.h"
 
+#include <algorithm>
+
 namespace qx {
 
 // A bounded fit as all models take it: in, and from `p` on, out.
@@ -43,6 +45,12 @@ ErrorCode FitLineRobustly(const FitSamples &samples, const FitBounds &bounds, in
                           double tolerance, int32_t *iterations, DBL *p, double *norm);
 
 // What the models share.
+
+// The steps of two passes, as far as they can be counted.
+inline int32_t StepsOfBoth(int32_t first, int32_t second) {
+    return static_cast<int32_t>(
+        std::min(int64_t{first} + second, int64_t{std::numeric_limits<int32_t>::max()}));
+}
 
 // How many parameters have room between their bounds.
 int32_t FreeParameters(const FitBounds &bounds, int32_t count);

@@ -278,7 +278,7 @@ ErrorCode FitLineRobustly(const FitSamples &samples, const FitBounds &bounds, in
     if (const ErrorCode failed = reweighting.allocate())
         return failed;
     Line line = LineWithin(samples, bounds);
-    const int32_t limit = std::max(*iterations, 1);
+    const int32_t limit = std::clamp(*iterations, 1, mostIterations);
     int32_t done = 0;
     // Samples that all lie on one side of the plain line would take its place as the bulk of the
     // data; the line of least absolute residuals goes through the bulk.

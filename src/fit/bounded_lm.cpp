@@ -6,6 +6,7 @@
 #include "linalg/matrix.h"
 #include "linalg/systems/least_squares.h"
 
+#include <algorithm>
 #include <cmath>
 #include <cstring>
 #include <utility>
@@ -199,6 +200,11 @@ public:
                 return ErrNonFiniteInput;
             if (before < after || std::isnan(after)) {
                 *lambda *= 10.0;
+                if (*lambda == 0.0) { // no damping grows from it: the rest repeats this step
+                    if (limit >= 0)
+                        k = limit + 1;
+                    return 0;
+                }
                 if (*lambda <= 10000.0)
                     continue;
                 if (!release())
@@ -364,7 +370,7 @@ ErrorCode BoundedLM(const FitModel &model, const FitSamples &samples, int32_t me
         tolerance = 1e-8;
     if (*lambda <= 0.0)
         *lambda = 1.0;
-    const int32_t limit = *iterations;
+    const int32_t limit = std::min(*iterations, mostIterations);
     const ErrorCode status = iteration.run(p, limit, tolerance, lambda, iterations);
     Copy(p, iteration.point(), model.count);
     if (status != 0 && status != ErrIterationLimit)

@@ -4,6 +4,9 @@
 #include "fit/robust_weights.h"
 #include "qx/errors.h"
 
+#include <cstdint>
+#include <limits>
+
 namespace qx {
 
 // What is fitted: n samples, and weights of which the absolute value counts, or null for none.
@@ -55,6 +58,9 @@ ErrorCode EvalLeastAbsolute(const FitModel &model, const FitSamples &samples, co
 ErrorCode EvalBisquare(const FitModel &model, const FitSamples &samples, const DBL *p, DBL *a,
                        DBL *g, double *cost, DBL *work);
 
+// The largest limit that counts: one step beyond it can still be counted.
+constexpr int32_t mostIterations = std::numeric_limits<int32_t>::max() - 1;
+
 // Levenberg-Marquardt iteration from p within the bounds, with the damping a (1 + lambda) + lambda
 // of the diagonal (K. Levenberg, "A method for the solution of certain non-linear problems in least
 // squares", 1944; D. W. Marquardt, "An algorithm for least-squares estimation of nonlinear
@@ -65,7 +71,8 @@ ErrorCode EvalBisquare(const FitModel &model, const FitSamples &samples, const D
 // the damping has passed 10000 without a better point, where the cost is 0, and with bisquare where
 // no parameter changes by more than the tolerance times itself. A tolerance of 0 or below is 1e-8,
 // and such a damping 1. *iterations is the limit, below 0 for none, and becomes the count of steps
-// that were tried after the first; *lambda becomes the last damping. fit, where not null, takes the
+// that were tried after the first. Where the damping has fallen to 0 and the step is worse, all steps
+// up to the limit would be the same, and count without being tried. *lambda becomes the last damping. fit, where not null, takes the
 // model at all x; *mse is the cost, with bisquare the mean of |w| r^2.
 //
 // ErrEmptyInput (no samples, or no p), ErrPolynomialOrderTooHigh (fewer samples than parameters),

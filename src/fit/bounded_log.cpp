@@ -137,7 +137,7 @@ ErrorCode FitBoundedLog(const BoundedFit &request, double base) {
         if (status != 0 && status != ErrIterationLimit)
             return status;
     }
-    *request.iterations = first + second;
+    *request.iterations = StepsOfBoth(first, second);
     for (int32_t i = 0; i < request.samples.n; ++i)
         request.fit[i] = LogModel::value(request.samples.x[i], request.p, &constants);
     return 0;

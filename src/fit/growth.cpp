@@ -7,6 +7,7 @@
 #include "linalg/matrix.h"
 
 #include <cmath>
+#include <cstring>
 
 namespace qx {
 
@@ -55,6 +56,33 @@ ErrorCode FitLogarithms(const GrowthData &data, double sign, DBL *pq) {
     return SolveLinearModel({writeRows, data.n, 2, nullptr}, bySVD, pq, nullptr);
 }
 
+// Where a step follows from the parameters alone, parameters that come back come back for ever:
+// rounding ends most iterations of a small tolerance in such a cycle. R. P. Brent, "An improved
+// Monte Carlo factorization algorithm", 1980, finds it in a few times the steps that lead into it
+// and once around.
+class Cycle {
+public:
+    // The number of steps after as many whole rounds as fit below `limit`, from `count` on: the
+    // parameters are the same then.
+    int32_t skipRounds(const Parameters &at, int32_t count, int32_t limit) {
+        if (count > noted_ && count < limit && isSame(at))
+            return count + (limit - count) / (count - noted_) * (count - noted_);
+        if (count / 2 >= noted_) {
+            earlier_ = at;
+            noted_ = count;
+        }
+        return count;
+    }
+
+private:
+    bool isSame(const Parameters &at) const { // to the bit
+        return std::memcmp(&at, &earlier_, sizeof at) == 0;
+    }
+
+    Parameters earlier_ = {};
+    int32_t noted_ = 0;
+};
+
 // Gauss-Newton iteration. `values` has g of all samples for the latest parameters.
 template <double (*G)(const GrowthData &, double, int32_t)>
 class Iteration {
@@ -95,10 +123,13 @@ public:
         Parameters latest = *best;
         double earlier = 2.0 * latest.mse;
         int32_t count = 0;
+        Cycle cycle;
         *steps = 0;
         while (limits.iterations >= 0 &&
                std::fabs(earlier - latest.mse) > earlier * limits.tolerance &&
                latest.mse > limits.floor) {
+            // Up to here no step ends the iteration for being worse, and the best is known.
+            count = cycle.skipRounds(latest, count, limits.iterations / 10);
             earlier = latest.mse;
             if (const ErrorCode failed = step(&latest))
                 return failed;

@@ -4,6 +4,10 @@
 #include "qx/errors.h"
 #include "qx/types.h"
 
+#include <algorithm>
+#include <cstdint>
+#include <limits>
+
 namespace qx {
 
 // When the iteration of a model fit ends: the MSE changes by no more than `tolerance` of itself, or
@@ -14,7 +18,9 @@ struct FitLimits {
     double floor;
     int32_t iterations;
     FitLimits settled() const {
-        return {tolerance <= 0.0 ? 0.0001 : tolerance, floor <= 0.0 ? 1e-12 : floor, iterations};
+        constexpr int32_t most = std::numeric_limits<int32_t>::max() - 1; // one beyond is counted
+        return {tolerance <= 0.0 ? 0.0001 : tolerance, floor <= 0.0 ? 1e-12 : floor,
+                std::min(iterations, most)};
     }
 };
 

@@ -79,14 +79,18 @@ ErrorCode CentralDerivative(InOut<DBL1D> x, const double *initial, const double 
 }
 
 ErrorCode CheckDerivativeEnds(int32_t rule, int32_t initial, int32_t final) {
-    struct Needs {
-        int32_t initial, final;
-    };
-    constexpr Needs needs[] = {{1, 1}, {2, 2}, {0, 1}, {1, 0}};
-    if (rule < CentralSecondOrder || rule > Backward)
+    switch (rule) {
+    case CentralSecondOrder:
+        return FirstFailed({{initial < 1 || final < 1, ErrEmptyInput}});
+    case CentralFourthOrder:
+        return FirstFailed({{initial < 2 || final < 2, ErrFewerThanTwo}});
+    case Forward:
+        return FirstFailed({{final < 1, ErrEmptyInput}});
+    case Backward:
+        return FirstFailed({{initial < 1, ErrEmptyInput}});
+    default:
         return ErrInvalidSelector;
-    return FirstFailed(
-        {{initial < needs[rule].initial || final < needs[rule].final, ErrEmptyInput}});
+    }
 }
 
 ErrorCode DerivativeByRule(InOut<DBL1D> x, In<DBL1D> initial, In<DBL1D> final, double dt,

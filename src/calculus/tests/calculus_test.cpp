@@ -376,6 +376,33 @@ TEST(Derivatives, HaveTheirOrder) {
     EXPECT_EQ(x[0], 6.0);
 }
 
+// The values that a rule needs on either side, and as many with others behind them.
+TEST(RunningForms, TakeTheFirstOfLongerEnds) {
+    struct Needs {
+        int32_t initial, final;
+    };
+    const auto expectSame = [](const Needs &needs, int32_t rule, const auto &compute) {
+        const Samples ends = {2.0, 3.0, 5.0};
+        const DBLArray longer(ends);
+        const DBLArray initial(Samples(ends.begin(), ends.begin() + needs.initial));
+        const DBLArray final(Samples(ends.begin(), ends.begin() + needs.final));
+        const DBLArray x{7.0, 11.0, 17.0}, y{7.0, 11.0, 17.0};
+        EXPECT_EQ(compute(x.handle(), longer.handle(), longer.handle(), rule), 0);
+        EXPECT_EQ(compute(y.handle(), initial.handle(), final.handle(), rule), 0);
+        EXPECT_EQ(x.values(), y.values()) << rule;
+    };
+    const Needs ofIntegral[] = {{1, 0}, {1, 1}, {2, 1}, {2, 2}};
+    const Needs ofDerivative[] = {{1, 1}, {2, 2}, {0, 1}, {1, 0}};
+    for (int32_t rule = 0; rule < 4; ++rule) {
+        expectSame(ofIntegral[rule], rule, [](DBL1D x, DBL1D initial, DBL1D final, int32_t r) {
+            return Integral90(x, initial, final, dt, r);
+        });
+        expectSame(ofDerivative[rule], rule, [](DBL1D x, DBL1D initial, DBL1D final, int32_t r) {
+            return Derivative85(x, initial, final, &dt, r);
+        });
+    }
+}
+
 TEST(Derivatives, CodesComeInTheirOrder) {
     const double end = 1.0;
     const auto elder = [&](int32_t n, double step) {
@@ -403,8 +430,9 @@ TEST(Derivatives, CodesComeInTheirOrder) {
     EXPECT_EQ(byRule(3, 2, 2, 1.0, -1), ErrInvalidSelector);
     EXPECT_EQ(byRule(3, 0, 1, 1.0, 0), ErrEmptyInput);
     EXPECT_EQ(byRule(3, 1, 0, 1.0, 0), ErrEmptyInput);
-    EXPECT_EQ(byRule(3, 1, 2, 1.0, 1), ErrEmptyInput);
-    EXPECT_EQ(byRule(3, 2, 1, 1.0, 1), ErrEmptyInput);
+    EXPECT_EQ(byRule(3, 1, 2, 1.0, 1), ErrFewerThanTwo);
+    EXPECT_EQ(byRule(3, 2, 1, 1.0, 1), ErrFewerThanTwo);
+    EXPECT_EQ(byRule(3, 0, 0, 1.0, 1), ErrFewerThanTwo);
     EXPECT_EQ(byRule(3, 2, 0, 1.0, 2), ErrEmptyInput);
     EXPECT_EQ(byRule(3, 0, 1, nan, 2), 0);
     EXPECT_EQ(byRule(3, 0, 2, 1.0, 3), ErrEmptyInput);

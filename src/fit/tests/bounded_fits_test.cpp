@@ -333,6 +333,38 @@ TEST(BoundedLM, CountsItsStepsAndTakesMemoryOnce) {
     EXPECT_EQ(mse, 0.0);
 }
 
+// Long after the damping has fallen to 0 a step is worse: the same one would be tried for ever.
+TEST(BoundedLM, DoesNotRepeatAStepWithoutDamping) {
+    struct Calls {
+        int32_t *count;
+    };
+    int32_t calls = 0;
+    const Calls user = {&calls};
+    const qx::FitModel model = {
+        1, [](double, const DBL *, int32_t, const void *) { return 0.0; }, nullptr,
+        [](const qx::FitSamples &, const DBL *, int32_t, double *mse, DBL *a, DBL *, DBL *g,
+           const void *constants) {
+            const int32_t count = ++*static_cast<const Calls *>(constants)->count;
+            *mse = count < 1000 ? 1.0 - 1e-4 * count : 2.0;
+            *a = *g = 1.0;
+        },
+        &user};
+    const DBL x[] = {0}, y[] = {0};
+    for (const int32_t limit : {1000000, std::numeric_limits<int32_t>::max() - 1}) {
+        calls = 0;
+        DBL p[] = {0};
+        int32_t iterations = limit;
+        double lambda = 0.1, mse;
+        EXPECT_EQ(qx::BoundedLM(model, {x, y, nullptr, 1}, 0, {nullptr, nullptr}, p, &iterations,
+                                1e-300, &lambda, nullptr, &mse),
+                  0);
+        ASSERT_LT(calls, 1100);
+        EXPECT_EQ(iterations, limit + 1);
+        EXPECT_EQ(lambda, 0.0);
+        EXPECT_LT(mse, 0.91);
+    }
+}
+
 // Every set of the statistical reference data from both starts, by differences alone. The starts
 // that lead elsewhere are far from the answer on purpose.
 TEST(BoundedLM, FindsTheCertifiedValues) {

@@ -1,15 +1,18 @@
 #include "fit/tests/least_squares.h"
 #include "qx/qx.h"
+#include "tests/support/heap_probe.h"
 #include "tests/support/recipe.h"
 
 #include <gtest/gtest.h>
 
 #include <cmath>
 #include <functional>
+#include <limits>
 
 namespace {
 
 using qx::test::DBLArray;
+using qx::test::HeapProbe;
 using qx::test::infinity;
 using qx::test::Long;
 using qx::test::MeanSquare;
@@ -254,6 +257,30 @@ TEST(ModelFits, LimitsOfGaussNewton) {
     EXPECT_LE(astray.mse, static_cast<double>(atGuess));
     const Fitted near = FitExp(x, y, {.guess = {1.8, 0.9}});
     EXPECT_NEAR(near.p[0], done.p[0], 1e-6);
+}
+
+// With a small tolerance rounding ends an iteration in a cycle of steps. Its rounds are counted
+// without being made, so that a large limit costs no more than a small one.
+TEST(ModelFits, CyclesOfGaussNewtonCostNothing) {
+    if (!HeapProbe::works())
+        GTEST_SKIP();
+    const Samples x = {1, 2, 3}, y = {0, 2, 9};
+    for (const auto &fit : {FitExp, FitPower}) {
+        const auto within = [&](int32_t limit) {
+            return fit(x, y, {.tolerance = 1e-300, .iterations = limit});
+        };
+        const Fitted some = within(1000);
+        EXPECT_GT(some.iterations, 100);
+        for (const int32_t limit : {2000000, std::numeric_limits<int32_t>::max()}) {
+            const HeapProbe probe;
+            const Fitted many = within(limit);
+            ASSERT_LT(probe.allocations(), 2000) << "each step takes memory";
+            EXPECT_EQ(many.iterations - some.iterations, limit / 10 - 100);
+            EXPECT_EQ(many.p, some.p);
+            EXPECT_EQ(many.mse, some.mse);
+            EXPECT_EQ(many.fit, some.fit);
+        }
+    }
 }
 
 TEST(ModelFits, Guesses) {

@@ -149,6 +149,10 @@ Outcome Peaks(DBL1D source, InOutRequest request, InOutStream stream, int32_t mo
         return bad;
 
     const bool isFirst = (request->flags & QXPeakFirstBlock) != 0;
+    // Before the buffer takes memory for a window that the block cannot fill.
+    const int32_t n = mode == flatSourceCopy ? scanned.size() : request.data().size();
+    if (isFirst && n < w)
+        return ErrWidthOutOfRange;
     const bool isLast = (request->flags & QXPeakLastBlock) != 0;
     const bool ofValleys = request->polarity == 1;
     PeakDState *state = nullptr;

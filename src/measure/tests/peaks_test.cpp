@@ -418,7 +418,7 @@ TEST(PeakD, EveryFailureReleasesTheStream) {
     EXPECT_EQ(Stream(5, 0, 0, 3).put(x, whole), ErrInvalidSelector);
     EXPECT_EQ(Stream(5).put({1, 2, 3, 4}, whole), ErrWidthOutOfRange);
     EXPECT_EQ(Stream(5).put(x, 0), ErrStateSizeMismatch) << "a stream that was never begun";
-    EXPECT_EQ(Stream(1 << 29).put(x, whole), ErrOutOfMemory) << "more than an array can have";
+    EXPECT_EQ(Stream(1 << 29).put(x, whole), ErrWidthOutOfRange) << "no buffer is asked for";
     {
         Stream stream(5);
         stream.hasBuffer = false;

@@ -431,7 +431,11 @@ TEST(Pulses, ReferencesMayBeAbsolute) {
     EXPECT_EQ(node.pulse({}, 1, 1).status, ErrMeasureEmpty);
     EXPECT_EQ(node.pulse(y, 2, 1).status, ErrInvalidSelector);
     EXPECT_EQ(node.pulse(y, 1, 1, 0, 2).status, ErrInvalidSelector);
-    EXPECT_EQ(node.pulse(y, 1, std::numeric_limits<int32_t>::max()).status, ErrMeasureOutOfMemory);
+    // Of crossings that there cannot be no memory is taken.
+    for (const int32_t number : {1000000, std::numeric_limits<int32_t>::max()}) {
+        const HeapProbe probe(0, 1 << 16);
+        EXPECT_EQ(node.pulse(y, 1, number).status, ErrMeasureSearchShort);
+    }
     node.dt = -1;
     EXPECT_EQ(node.pulse(y, 1, 1).status, ErrMeasureLevelsReversed);
     Numbers r;
@@ -592,8 +596,10 @@ TEST(Transitions, RefuseWhatHasNone) {
     node.ref = {0.5, 0.5, 0.5, 0};
     EXPECT_EQ(node.transition(y, 1, 1).status, ErrMeasureRangeReversed);
     node.ref = {0.9, 0.5, 0.1, 0};
-    EXPECT_EQ(node.transition(y, 1, std::numeric_limits<int32_t>::max()).status,
-              ErrMeasureOutOfMemory);
+    for (const int32_t number : {1000000, std::numeric_limits<int32_t>::max()}) {
+        const HeapProbe probe(0, 1 << 16);
+        EXPECT_EQ(node.transition(y, 1, number).status, ErrMeasureTooFewPoints);
+    }
     node.hist = {QXLevelsByHistogram, 1};
     EXPECT_EQ(node.transition(y, 1, 1).status, ErrMeasureNotPositive) << "one bin has both states";
     // Peaks that hardly anybody reaches.
