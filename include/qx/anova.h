@@ -22,7 +22,8 @@ QX_API int32_t Contingency_head(QX_IN I32_2D table, QX_OUT DBL *chiSquare, QX_OU
     probability p of a larger one. Sums of squares are differences of large sums from a single pass,
     so a large mean costs digits, and a sum that is 0 in truth, as the error of levels of equal
     values or what lies between levels of equal means, may come out as a small number of either
-    sign: f is then infinite, huge or negative, and p 0 for a huge f, 1 for a negative one.
+    sign: f is then infinite, huge or negative, and p 0 for a huge f, 1 for a negative one. The
+    squares of values beyond 1e154 overflow: a sum of squares is then infinite, or f is NaN.
     Codes: ErrSizeMismatch (the lengths differ), ErrEmptyInput (y is empty), ErrAnovaFewLevels (k is
     below 2 or not below the number of observations), ErrOutOfMemory (no scratch memory),
     ErrAnovaFactorEmpty (more labels than k), ErrAnovaNoReplication (fewer),
@@ -33,7 +34,7 @@ QX_API int32_t Anova1Way_head(QX_IN DBL1D y, QX_IN I32_1D labels, QX_IN const in
                               QX_OUT DBL *ssTotal, QX_OUT ErrorCode *err);
 
 /** As Anova1Way_head, with the value that f exceeds with probability alpha, by bisection to 1e-4,
-    infinite for an alpha of 0.
+    infinite for an alpha of 0 and up to 5.5e-17, where 1 - alpha is 1.
     Codes: ErrSizeMismatch (the lengths differ), ErrEmptyInput (y is empty), ErrAnovaFewLevels (k is
     below 2 or not below the number of observations), ErrBadSignificance (alpha lies outside [0,
     1]), ErrOutOfMemory (no scratch memory), ErrAnovaFactorEmpty (more labels than k),

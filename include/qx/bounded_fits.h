@@ -14,21 +14,23 @@
    method is 0 for least squares, 1 for least absolute residuals and 2 for bisquare, and mse the
    mean of |w| r^2 over the residuals r, for least absolute residuals the mean of |w r|. tolerance
    is relative, 0 or below for 0.0001. *iterations is the limit and becomes the number of steps
-   done. guess holds start values for the coefficients; where it is empty or too short the fit makes
-   its own. The function result is the code. A failure makes numbers NaN, *iterations 0 and y
-   empty. */
+   done; a step takes time in proportion to the samples, by bisquare twice and more, and with a
+   tolerance that they cannot reach the steps go on to the limit. guess holds start values for the
+   coefficients; where it is empty or too short the fit makes its own. The function result is the
+   code. A failure makes numbers NaN, *iterations 0 and y empty. */
 
 #include "qx/types.h"
 
 QX_BEGIN_DECLS
 
 /** The line y = a x + b within bounds by least squares. A plain line that lies within them is the
-    answer; else a barrier method and the closed forms on the edges of the bounds find the best
-    one. Equal x give NaN or infinities. Codes: ErrSizeMismatch (x or w does not fit y),
-    ErrSizesDisagree (lower or upper have one element, or they differ in length), ErrNaNInData (a
-    bound is NaN), ErrFitPointsTooFew (fewer samples than free coefficients), ErrNonFiniteInput (a
-    weight is NaN or infinite), ErrTooFewWeights (only one weight is not 0), ErrBoundsCrossed (a
-    lower bound is above its upper one), ErrOutOfMemory (no memory where an input is y). */
+    answer; else a barrier method and the closed forms on the edges of the bounds find the best one.
+    Equal x give NaN or infinities, with the code 0, and so do x and y whose squares and products
+    leave the range of numbers. Codes: ErrSizeMismatch (x or w does not fit y), ErrSizesDisagree
+    (lower or upper have one element, or they differ in length), ErrNaNInData (a bound is NaN),
+    ErrFitPointsTooFew (fewer samples than free coefficients), ErrNonFiniteInput (a weight is NaN or
+    infinite), ErrTooFewWeights (only one weight is not 0), ErrBoundsCrossed (a lower bound is above
+    its upper one), ErrOutOfMemory (no memory where an input is y). */
 QX_API ErrorCode BoundLinearFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w,
                                      QX_IN DBL1D lower, QX_IN DBL1D upper, QX_OUT double *a,
                                      QX_OUT double *b, QX_OUT double *mse);
@@ -51,7 +53,8 @@ QX_API ErrorCode BoundLinearFitLAR_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN D
 
 /** As BoundLinearFitLAR_head, by bisquare weights: (1 - u^2)^2 for |u| < 1 and 0 beyond, u being
     the residual, divided by sqrt(1 - leverage), by 4.685 and by the median distance of all from
-    their median over 0.6745. P. W. Holland and R. E. Welsch, "Robust regression using iteratively
+    their median over 0.6745. The lines may wander without end among some that fit about as well:
+    they use up any limit then. P. W. Holland and R. E. Welsch, "Robust regression using iteratively
     reweighted least-squares", 1977. */
 QX_API ErrorCode BoundLinearFitBi_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w,
                                        double tolerance, QX_INOUT int32_t *iterations,
@@ -99,7 +102,9 @@ QX_API ErrorCode BoundPowerFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D
 
 /** y = a log(b x) to the base, with x above 0, within bounds: the line over log(x) where that lies
     within them, else Levenberg-Marquardt steps from there. A base of 2.71828, these six digits,
-    stands for e. guess is not needed. Codes: ErrSizeMismatch (x or w does not fit y),
+    stands for e. guess is not needed. What leaves the range of numbers is infinite or NaN, with the
+    code 0: the mse for y from 1e154 on, and b and the values, as in LogFit_head, where x are equal,
+    the base is 1 or y hardly depends on x. Codes: ErrSizeMismatch (x or w does not fit y),
     ErrSizesDisagree (lower or upper have one element, or they differ in length), ErrNaNInData (a
     bound is NaN, or a residual is), ErrFitPointsTooFew (fewer samples than free coefficients),
     ErrNonFiniteInput (a weight is NaN or infinite, or the cost is at the start and at the next

@@ -5,15 +5,19 @@
    matrix of terms. Weights are empty or one per sample and count by their absolute values; a mean
    squared error (MSE) is the sum of |w| (y - fit)^2 over the number of samples, formed as
    y^2 + (fit - 2 y) fit, so that a fit without residuals may leave one of the size of 2.2e-16 times
-   y^2 of either sign. A failure empties the arrays and makes the numbers NaN. */
+   y^2 of either sign. A failure empties the arrays and makes the numbers NaN.
+   Overflow is not looked for: coefficients and values that pass the largest number become infinite
+   or NaN, with the code 0. The MSE does so for y from 1e154 on, covariances for columns of H below
+   1e-154. */
 
 #include "qx/types.h"
 
 QX_BEGIN_DECLS
 
 /** The line y = slope x + intercept; its values take the place of y. In closed form with plain
-    sums, so abscissae that are all equal give NaN or infinities and no failure, and abscissae far
-    from 0 cost digits. Weights that are all 0 count as none.
+    sums, so abscissae that are all equal give NaN or infinities and no failure, abscissae far from
+    0 cost digits, and those whose squares leave the range, from 1e154 on or all below 1e-162, give
+    NaN or infinities, too. Weights that are all 0 count as none.
     Codes: ErrSizeMismatch (the arrays differ in length), ErrFewerThanTwo (less than two samples),
     ErrNonFiniteInput (a weight is NaN), ErrTooFewWeights (all weights but one are 0),
     ErrOutOfMemory (no memory where x or w is y). */
@@ -32,9 +36,9 @@ QX_API int32_t LinFitCoef80_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, QX
                                  QX_OUT double *intercept, QX_OUT ErrorCode *err);
 
 /** The polynomial sum of coefficients[j] x^j, j = 0 to `order`, and its values. In raw powers of x:
-    for a high order bring x to the size of 1 beforehand. `algorithm` chooses the method as in
-    GenLSFit80_head. At most 26 coefficients are fitted; those of orders above 25 are 0, with a
-    warning.
+    for a high order bring x to the size of 1 beforehand, since powers beyond the range fail and
+    those below it make coefficients infinite. `algorithm` chooses the method as in GenLSFit80_head.
+    At most 26 coefficients are fitted; those of orders above 25 are 0, with a warning.
     Codes: ErrSizeMismatch (the arrays differ in length), ErrPolynomialOrderNegative (order is
     negative), ErrPolynomialOrderTooHigh (not more samples than `order`), ErrOutOfMemory (no memory,
     or the host refused a resize), ErrInvalidSelector (no such algorithm), ErrNonFiniteInput (a
@@ -93,7 +97,10 @@ QX_API ErrorCode GenLSFit_head(QX_IN DBL2D H, QX_IN DBL1D y, QX_IN DBL1D deviati
 /** How well `fit` describes y: *sse, the weighted sum of squared residuals; *rSquare, 1 less its
     ratio to the squares of y about its mean; *rmse, sqrt(sse / dof). The weights count with their
     signs, and the mean is the plain one. dof, the residual degrees of freedom, becomes n - 2 where
-    it is not above 0. Where all y are equal, *rSquare is 1 without residuals, else infinite.
+    it is not above 0; with two samples that is 0, and *rmse NaN or infinite. Where all y are equal,
+    *rSquare is 1 without residuals, else infinite. Where rounding leaves *sse below 0, as it may
+    for a fit without residuals, *rmse is NaN. From 1e154 on y and fit overflow: all three are
+    infinite or NaN.
     Codes: ErrEmptyInput (y is empty), ErrSizeMismatch (the arrays differ in length),
     ErrFewerThanTwo (one sample), ErrTooFewForParameters (not more samples than dof). */
 QX_API ErrorCode GoodnessOfFit_head(QX_IN DBL1D y, QX_IN DBL1D fit, QX_IN DBL1D w, int32_t dof,
@@ -101,8 +108,8 @@ QX_API ErrorCode GoodnessOfFit_head(QX_IN DBL1D y, QX_IN DBL1D fit, QX_IN DBL1D 
                                     QX_OUT double *rmse);
 
 /** One damped step of a fit: solves for d the system a d = gradient, in which the diagonal of a is
-    multiplied by 1 + *lambda, and adds d to the coefficients. The code stands in *err and is the
-    function result, too.
+    multiplied by 1 + *lambda, and adds d to the coefficients. A step that overflows makes a
+    coefficient infinite, with the code 0. The code stands in *err and is the function result, too.
     Codes: ErrEmptyInput (the sizes are 0 or disagree), ErrOutOfMemory (no memory),
     ErrNonFiniteInput (a diagonal element is not finite), ErrSingularMatrix (the system is singular,
     or a new coefficient is NaN). */

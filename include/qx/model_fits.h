@@ -6,9 +6,13 @@
    squared error (MSE) is that of qx/linear_fits.h. `tolerance` ends an iteration when the MSE
    changes by less than this part of itself, `floor` when it is no larger; 0 or below select 0.0001
    and 1e-12. *iterations is the limit on entry, of which a negative one allows no step, and the
-   number of steps on return. A guess has one value for each coefficient; of a longer one the first
-   values count, a shorter one counts as none, and both give a warning. A failure empties y where it
-   is an output and makes the numbers NaN. */
+   number of steps on return. A step takes time in proportion to the samples, and with a tolerance
+   that it cannot reach a fit makes as many as the limit allows. A guess has one value for each
+   coefficient; of a longer one the first values count, a shorter one counts as none, and both give
+   a warning. A failure empties y where it is an output and makes the numbers NaN.
+   Overflow is not looked for: where a coefficient or a value of the model passes the largest
+   number, as with the exponential of 710, it is infinite and what depends on it infinite or NaN,
+   with the code 0. The MSE is so for y from 1e154 on. */
 
 #include "qx/types.h"
 
@@ -16,7 +20,10 @@ QX_BEGIN_DECLS
 
 /** y = a exp(b x) by the line through (x, ln |y|) with weights w y^2, which make up for the
     logarithm; its values take the place of y. Samples without the sign of most do not count. The
-    weights are 1 / sd^2, and 1 where sd is 0.
+    weights are 1 / sd^2, and 1 where sd is 0. Where the x that count are all equal, no exponential
+    is determined: rounding decides between those through the mean of ln |y|, and most are so steep
+    that a or b is infinite or 0 and the values are infinite or NaN, with the code 0. The same holds
+    for x below 1e-305.
     Codes: ErrSizeMismatch (the arrays differ in length), ErrFewerThanTwo (less than two samples),
     ErrNonFiniteInput (a weight is NaN, or a sample not finite), ErrTooFewWeights (all weights but
     one are 0), ErrPolynomialOrderTooHigh (less than two values have the sign of most),
@@ -25,7 +32,8 @@ QX_API ErrorCode ExpFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D deviat
                              QX_OUT double *a, QX_OUT double *b, QX_OUT double *mse);
 /** y = a exp(b x), with weights as they are. Method 0 is that of ExpFit_head, which leaves
     *iterations; any other goes on from there, or from the guess (a, b), by Gauss-Newton steps and
-    takes the best. A guess that is not finite gives NaN.
+    takes the best. A guess that is not finite gives NaN. Steps that come back in a cycle, as
+    rounding makes them do with a small tolerance, are counted but not repeated.
     Codes: ErrSizeMismatch (the arrays differ in length), ErrFewerThanTwo (less than two samples),
     ErrNonFiniteInput (a weight is NaN, or a sample or a step's exponential not finite),
     ErrTooFewWeights (all weights but one are 0), ErrPolynomialOrderTooHigh (less than two values
@@ -48,7 +56,9 @@ QX_API ErrorCode ExpFitCoef80_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, 
 
 /** y = a x^b for x above 0, by Gauss-Newton steps from the guess (a, b), or from the line through
     (ln x, ln |y|) with weights w y^2; the best step wins and its values take the place of y. A
-    guess that is not finite gives NaN.
+    guess that is not finite gives NaN. Steps in a cycle are those of ExpFit80_head. Where the x
+    that count are all equal, rounding decides, and a or b may be infinite or 0, with the code 0; a
+    step may also carry b to an infinity where x^b stays finite.
     Codes: ErrSizeMismatch (the arrays differ in length), ErrFewerThanTwo (less than two samples),
     ErrNonFiniteInput (a weight is NaN, or a sample or a step's power not finite), ErrTooFewWeights
     (all weights but one are 0), ErrNotStrictlyPositive (an x is not above 0),
@@ -65,7 +75,10 @@ QX_API ErrorCode PowerFitCoef_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, 
 
 /** y = a log(b x) to the given base, for x of one sign, which b takes; its values take the place of
     y. In closed form by the line through (log |x|, y). The base 2.71828, these six digits, stands
-    for e; e in all its digits is a base like any other and differs in the last bits.
+    for e; e in all its digits is a base like any other and differs in the last bits. Where all x
+    are equal, and with a base of 1, a and b are NaN, infinite or left to rounding, with the code 0.
+    Where y hardly depends on x, b is the base to a power that overflows to infinity or vanishes,
+    and the values are infinite.
     Codes: ErrSizeMismatch (the arrays differ in length), ErrNotStrictlyPositive (the base is 0 or
     below), ErrFewerThanTwo (less than two samples), ErrNonFiniteInput (a weight is NaN),
     ErrTooFewWeights (all weights but one are 0), ErrMixedSigns (the x are neither all above nor all
@@ -79,9 +92,10 @@ QX_API ErrorCode LogFitCoef_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, do
 /** y = a exp(-((x - c) / s)^2 / 2), a peak up or down, by steepest descent with halved steps from
     the guess (a, c, s), or from the logarithms of what lies above a tenth of the peak; its values
     take the place of y. *iterations counts the trials. Steepest descent converges slowly where the
-    sizes of a, c and s differ much, and ends by the tolerance then. A guess that is not finite
-    counts as none. A peak that alone lies above a tenth of its height is taken through three
-    points, and *iterations is 0.
+    sizes of a, c and s differ much, and ends by the tolerance then; with a tolerance of nearly 0 it
+    may creep on for millions of trials, up to the limit. x from 1e154 on overflow: s is infinite,
+    with the code 0. A guess that is not finite counts as none. A peak that alone lies above a tenth
+    of its height is taken through three points, and *iterations is 0.
     Codes: ErrSizeMismatch (the arrays differ in length), ErrFewerThanThree (less than three
     samples), ErrNonFiniteInput (a weight is NaN, or an x not finite), ErrTooFewWeights (less than
     three weights are not 0), ErrFitStartValues (the deviation to start from is 0, or a lone peak

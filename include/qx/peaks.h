@@ -77,15 +77,17 @@ QX_API ErrorCode PeakD2010(QX_INOUT PeakDRequest *request, QX_INOUT PeakDState *
     mode 0 and 1 scan request->data; mode 2 scans `source`, and request->data plays no part. Modes 1
     and 2 look for flat blocks: where the block and its history span less than 1e-8, their mean is
     subtracted, in mode 1 in the caller's array, which stays changed, and every window is scaled to
-    1 before its parabola is fitted.
+    1 before its parabola is fitted. Overflow is not looked for:
+    amplitudes and second derivatives beyond the range of numbers are infinite.
 
-    *buffer gets 5 w + 3 elements with the first block. The last block and every failure empty it
-    and clear the state, so that the next call must start a stream. The code stands in *err as well.
+    *buffer gets 5 w + 3 elements with the first block, which has at least w. The last block and
+    every failure empty it and clear the state, so that the next call must start a stream. The code
+    stands in *err as well.
     Codes: ErrOutOfMemory (no memory, or the host refused a resize), ErrInvalidSelector (w below 3
     or above 1073741824, or no such mode or polarity), ErrStateSizeMismatch (not the first block and
-    the state is of another width), ErrNoUsableFit (buffer is null), ErrWidthOutOfRange (a block of
-    less than w samples), ErrOverflow (2^31 windows in one stream), ErrIterationLimit (the
-    operator of the window cannot be computed). */
+    the state is of another width), ErrWidthOutOfRange (a block of less than w samples),
+    ErrNoUsableFit (buffer is null), ErrOverflow (2^31 windows in one stream), ErrIterationLimit
+    (the operator of the window cannot be computed). */
 QX_API ErrorCode PeakD2014(QX_IN DBL1D source, QX_INOUT PeakDRequest *request,
                            QX_INOUT PeakDState *state, QX_INOUT DBL1D *buffer,
                            QX_OUT ErrorCode *err, int32_t mode);

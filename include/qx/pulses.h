@@ -11,9 +11,12 @@
    at first, of which the host is told so that it can clean up. An _IDP export keeps them in the
    host's instance data, which MeasurementUnreserveProc gives back, and is otherwise its twin.
 
-   NaN belongs to no state. Numeric results are 0 after a failure. `limit` is 0 or 1: with 1 the
-   automatic method takes both levels from the histogram or neither, and the regions of aberrations
-   end three times the transition's duration away from it. */
+   The counters take 4 bytes a bin for as long as the slot holds them, and every call that finds
+   levels by histogram or automatically clears and scans them all, however short the waveform is.
+   NaN belongs to no state. Numeric results are 0 after a failure. Times that pass the largest
+   number, as with a dt near 1e308, are infinite or NaN, with the code 0, and so is a slew rate by a
+   dt near 0. `limit` is 0 or 1: with 1 the automatic method takes both levels from the histogram or
+   neither, and the regions of aberrations end three times the transition's duration away. */
 
 #include "qx/types.h"
 
@@ -66,7 +69,9 @@ QX_API ErrorCode StateLevels_IDP(QX_IN DBL1D y, double t0, double dt, int32_t me
     time: the duration, the center, and the period between the crossings of number 2 pulseNumber - 1
     and 2 pulseNumber + 1 of the waveform; dutyCycle = duration / period. With `partial` the last
     crossing of the period may be missing; period and dutyCycle are then 0, as they always are with
-    it. Levels are computed only for references in percent, which come out as absolute values.
+    it. Levels are computed only for references in percent, which come out as absolute values. The
+    crossings are found as sample numbers plus t0, so a t0 far beyond the number of samples costs
+    digits, and from about 1e16 on duration and period are 0 and dutyCycle is NaN.
     Codes: ErrMeasureNullState (a pointer is null), ErrMeasureEmptyChannel (bins below 1),
     ErrMeasureTooManyChannels (unknown method), ErrOutOfMemory (no memory for the counters),
     ErrMeasureBadCount (pulseNumber below 1), ErrMeasureEmpty (y is empty), ErrMeasureLevelsReversed
@@ -136,15 +141,16 @@ QX_API ErrorCode TransMeas_IDP(QX_IN DBL1D y, double t0, double dt, uint16_t pol
 
 /** Mean and root mean square over cycle number `cycleNumber` (from 1), between the crossings of
     number 2 cycleNumber - 1 and 2 cycleNumber + 1 of the mid reference as PulseMeasEx counts them,
-    over whole samples; start and end in units of time. Afterwards `ref` has absolute levels, and
-   its `percent` as it was; a failure leaves it. Codes: ErrMeasureNullState (a pointer is null),
-   ErrMeasureEmptyChannel (bins below 1), ErrMeasureTooManyChannels (unknown method), ErrOutOfMemory
-   (no memory for the counters), ErrMeasureBadCount (cycleNumber below 1), ErrMeasureEmpty (y is
-   empty), ErrMeasureLevelsReversed (dt is not above 0), ErrInvalidSelector (limit is neither 0 nor
-   1), ErrMeasureNotPositive (no amplitude, as in StateLevels), ErrMeasureRangeReversed (the
-   references are out of order), ErrMeasureOutOfMemory (no memory for so many crossings),
-   ErrMeasureSearchShort (too few crossings), ErrMeasureNotFound (a cycle of no samples),
-   WarnMeasurePartial (as in StateLevels). */
+    over whole samples; start and end in units of time. Sums and squares that overflow, from 1e154
+    on, make mean and rms infinite or NaN. Afterwards `ref` has absolute levels, and its `percent`
+    as it was; a failure leaves it. Codes: ErrMeasureNullState (a pointer is null),
+    ErrMeasureEmptyChannel (bins below 1), ErrMeasureTooManyChannels (unknown method),
+    ErrOutOfMemory (no memory for the counters), ErrMeasureBadCount (cycleNumber below 1),
+    ErrMeasureEmpty (y is empty), ErrMeasureLevelsReversed (dt is not above 0), ErrInvalidSelector
+    (limit is neither 0 nor 1), ErrMeasureNotPositive (no amplitude, as in StateLevels),
+    ErrMeasureRangeReversed (the references are out of order), ErrMeasureOutOfMemory (no memory for
+    so many crossings), ErrMeasureSearchShort (too few crossings), ErrMeasureNotFound (a cycle of no
+    samples), WarnMeasurePartial (as in StateLevels). */
 QX_API ErrorCode CycleRMSAverage(QX_IN DBL1D y, double t0, double dt, int32_t cycleNumber,
                                  QX_INOUT ReferenceLevels *ref, QX_IN const HistogramOptions *hist,
                                  QX_INOUT MeasurementSlot *slot, QX_OUT double *mean,
@@ -167,8 +173,9 @@ QX_API ErrorCode CycleRMSAverage_IDP(QX_IN DBL1D y, double t0, double dt, int32_
     divides by 0. A waveform that starts above 50% holds a negative pulse: top and base are
     exchanged, the amplitude is negative, and the times are those of the waveform turned over;
     overshoot stays what lies above the upper level, undershoot what lies below the lower one. What
-    the waveform does not reach counts as its last sample in delay and width, and as its end, counted
-    from the last sample before the missing edge, in riseTime and fallTime. The function result is 0.
+    the waveform does not reach counts as its last sample in delay and width, and as its end,
+    counted from the last sample before the missing edge, in riseTime and fallTime. Where top - base
+    passes the largest number, amplitude and slewRate are infinite. The function result is 0.
     Codes: ErrEmptyInput (y is empty). */
 QX_API int32_t PulseParameters(QX_IN DBL1D y, QX_OUT double *top, QX_OUT double *base,
                                QX_OUT double *amplitude, QX_OUT double *delay, QX_OUT double *width,

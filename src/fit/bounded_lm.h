@@ -71,9 +71,10 @@ constexpr int32_t mostIterations = std::numeric_limits<int32_t>::max() - 1;
 // the damping has passed 10000 without a better point, where the cost is 0, and with bisquare where
 // no parameter changes by more than the tolerance times itself. A tolerance of 0 or below is 1e-8,
 // and such a damping 1. *iterations is the limit, below 0 for none, and becomes the count of steps
-// that were tried after the first. Where the damping has fallen to 0 and the step is worse, all steps
-// up to the limit would be the same, and count without being tried. *lambda becomes the last damping. fit, where not null, takes the
-// model at all x; *mse is the cost, with bisquare the mean of |w| r^2.
+// that were tried after the first. Where the damping has fallen to 0 and the step is worse, all
+// steps up to the limit would be the same, and count without being tried. *lambda becomes the last
+// damping. fit, where not null, takes the model at all x; *mse is the cost, with bisquare the mean
+// of |w| r^2.
 //
 // ErrEmptyInput (no samples, or no p), ErrPolynomialOrderTooHigh (fewer samples than parameters),
 // ErrInvalidSelector (no such method), ErrBoundsCrossed, ErrOutOfMemory, ErrNaNInData (no weights
