@@ -16,8 +16,9 @@ QX_BEGIN_DECLS
 QX_API int32_t Median_head(QX_IN DBL1D x, QX_OUT DBL *median, QX_OUT ErrorCode *err);
 
 /** The most frequent values of x in ascending order. With `intervals` above 0 the centres of the
-    fullest of so many bins of equal width; otherwise the values that occur most often, equal within
-    a relative distance of 2.22e-16. Empty for a single sample and where nothing occurs twice. The
+    fullest of so many bins of equal width, which takes time in proportion to their number but
+    memory only to that of the samples; otherwise the values that occur most often, equal within a
+    relative distance of 2.22e-16. Empty for a single sample and where nothing occurs twice. The
     code is the function result.
     Codes: ErrEmptyInput (x is empty), ErrOutOfMemory (no scratch memory or the host refused the
     resize). */

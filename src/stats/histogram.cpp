@@ -16,6 +16,14 @@ double UnitOfRange(double min, double max, int32_t bins) {
 
 } // namespace
 
+// Everything in units in which the range and its reciprocal stay finite.
+EqualBins::EqualBins(double min, double max, int32_t bins)
+    : max_(max), unit_(UnitOfRange(min, max, bins)), low_(min * unit_), bins_(bins) {
+    const double range = max * unit_ - low_;
+    width_ = range / bins;
+    perUnit_ = bins / range;
+}
+
 ErrorCode ArrayHistogram(const DBL *x, int32_t n, double min, double max, I32 *counts, DBL *centres,
                          int32_t bins) {
     if (max < min)
@@ -30,25 +38,16 @@ ErrorCode ArrayHistogram(const DBL *x, int32_t n, double min, double max, I32 *c
         return 0;
     }
 
-    // Everything in units in which the range and its reciprocal stay finite.
-    const double unit = UnitOfRange(min, max, bins);
-    const double low = min * unit;
-    const double range = max * unit - low;
-    const double width = range / bins;
-    double centre = low + 0.5 * width;
+    const EqualBins equal(min, max, bins);
+    EqualBins::Centre centre(equal);
     for (int32_t k = 0; k < bins; ++k) {
-        centres[k] = centre / unit;
-        centre += width;
+        centres[k] = centre.value();
+        centre.next();
     }
-    const double perUnit = bins / range;
     for (int32_t i = 0; i < n; ++i) {
-        // Tested as a double, since NaN and far outliers have no integer value. From 0 on the
-        // conversion is the floor.
-        const double position = (x[i] * unit - low) * perUnit;
-        if (position >= 0.0 && position < bins)
-            ++counts[static_cast<int32_t>(position)];
-        else if (x[i] == max)
-            ++counts[bins - 1];
+        const int32_t k = equal.of(x[i]);
+        if (k >= 0)
+            ++counts[k];
     }
     return 0;
 }

@@ -45,6 +45,34 @@ ErrorCode SingleMode(double value, Values &modes, int32_t *count) {
     return 0;
 }
 
+// Of bins that outnumber the samples by far only those that hold any are kept: their numbers take
+// the place of the samples, and the centres of the fullest that of their numbers.
+ErrorCode SparselyBinnedMode(const DBL *x, int32_t n, const EqualBins &bins, Values &modes,
+                             int32_t *count) {
+    if (const ErrorCode failed = modes.allocate(n))
+        return failed;
+    DBL *const a = modes.data();
+    for (int32_t i = 0; i < n; ++i)
+        a[i] = bins.of(x[i]);
+    SortAscending(a, n, 0, nullptr);
+    ModeList list = {a, 1, 0};
+    for (int32_t i = 0, run; i < n; i += run) {
+        const double bin = a[i];
+        for (run = 1; i + run < n && a[i + run] == bin; ++run) {
+        }
+        if (run > 1 && bin >= 0.0) // -1 is no bin
+            list.offer(bin, run);
+    }
+    EqualBins::Centre centre(bins);
+    int32_t bin = 0;
+    for (int32_t k = 0; list.best > 1 && k < list.count; ++k) {
+        for (; bin < a[k]; ++bin)
+            centre.next();
+        a[k] = centre.value();
+    }
+    return KeepModes(list, modes, count);
+}
+
 ErrorCode BinnedMode(const DBL *x, int32_t n, int32_t intervals, Values &modes, int32_t *count) {
     double max, min;
     int32_t maxIndex, minIndex;
@@ -52,6 +80,8 @@ ErrorCode BinnedMode(const DBL *x, int32_t n, int32_t intervals, Values &modes, 
         return failed;
     if (std::fabs(max - min) <= std::fabs(max) * kEpsilon)
         return SingleMode(max, modes, count);
+    if (intervals / 8 > n)
+        return SparselyBinnedMode(x, n, EqualBins(min, max, intervals), modes, count);
 
     Scratch<ElementType::I32> counts;
     if (const ErrorCode failed = counts.allocate(intervals))

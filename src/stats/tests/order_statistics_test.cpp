@@ -1,8 +1,10 @@
 #include "frame/scratch.h"
 #include "qx/errors.h"
 #include "qx/order_statistics.h"
+#include "stats/histogram.h"
 #include "stats/mode.h"
 #include "stats/order.h"
+#include "tests/support/heap_probe.h"
 #include "tests/support/hostile_host.h"
 #include "tests/support/recipe.h"
 
@@ -341,6 +343,30 @@ TEST(Mode, BinnedModesAreCentresOfTheFullestBins) {
     EXPECT_EQ(ModesOf({-2.0, -1.0, 0.0, -0.1, -1.9}, 2), (Values{-0.5}))
         << "a maximum of 0 has no tolerance";
     EXPECT_EQ(ModesOf({nan, nan}, 3), Values());
+}
+
+// Many bins for few samples are never laid out, and their modes are those of the histogram.
+TEST(Mode, BinsWithoutSamplesTakeNoMemory) {
+    for (const Values &x : HardArrays(40))
+        for (const int32_t intervals : {39, 319, 320, 328, 5000}) {
+            const int32_t n = 40;
+            const auto [min, max] = std::minmax_element(x.begin(), x.end());
+            if (*min == *max || std::isinf(*max))
+                continue;
+            std::vector<I32> counts(static_cast<std::size_t>(intervals));
+            std::vector<DBL> centres(counts.size());
+            qx::ArrayHistogram(DBLArray(x).data(), n, *min, *max, counts.data(), centres.data(),
+                               intervals);
+            const int32_t most = *std::max_element(counts.begin(), counts.end());
+            Values expected;
+            for (std::size_t k = 0; most > 1 && k < counts.size(); ++k)
+                if (counts[k] == most)
+                    expected.push_back(centres[k]);
+            EXPECT_EQ(ModesOf(x, intervals), expected) << intervals;
+        }
+    const qx::test::HeapProbe probe(0, 1 << 16);
+    constexpr int32_t intervals = std::numeric_limits<int32_t>::max();
+    EXPECT_EQ(ModesOf({0.0, 0.0, 1.0}, intervals), (Values{0.5 * (1.0 / intervals)}));
 }
 
 } // namespace
