@@ -20,8 +20,8 @@ QX_API int32_t Median_head(QX_IN DBL1D x, QX_OUT DBL *median, QX_OUT ErrorCode *
     memory only to that of the samples; otherwise the values that occur most often, equal within a
     relative distance of 2.22e-16. Empty for a single sample and where nothing occurs twice. The
     code is the function result.
-    Codes: ErrEmptyInput (x is empty), ErrOutOfMemory (no scratch memory or the host refused the
-    resize). */
+    Codes: ErrEmptyInput (x is empty), ErrOutOfMemory (no scratch memory, more than 268435455
+    intervals, or the host refused the resize). */
 QX_API ErrorCode ModeH(QX_IN DBL1D x, int32_t intervals, QX_OUT DBL1D modes);
 
 QX_END_DECLS

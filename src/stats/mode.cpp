@@ -5,6 +5,7 @@
 #include "stats/order.h"
 
 #include <cmath>
+#include <limits>
 
 namespace qx {
 
@@ -73,6 +74,9 @@ ErrorCode SparselyBinnedMode(const DBL *x, int32_t n, const EqualBins &bins, Val
     return KeepModes(list, modes, count);
 }
 
+// kept: as many as have centres in a block of memory, although none is taken for them
+constexpr int32_t mostIntervals = std::numeric_limits<int32_t>::max() / int32_t{sizeof(DBL)};
+
 ErrorCode BinnedMode(const DBL *x, int32_t n, int32_t intervals, Values &modes, int32_t *count) {
     double max, min;
     int32_t maxIndex, minIndex;
@@ -80,6 +84,8 @@ ErrorCode BinnedMode(const DBL *x, int32_t n, int32_t intervals, Values &modes, 
         return failed;
     if (std::fabs(max - min) <= std::fabs(max) * kEpsilon)
         return SingleMode(max, modes, count);
+    if (intervals > mostIntervals)
+        return ErrOutOfMemory;
     if (intervals / 8 > n)
         return SparselyBinnedMode(x, n, EqualBins(min, max, intervals), modes, count);
 

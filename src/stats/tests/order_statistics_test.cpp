@@ -365,8 +365,9 @@ TEST(Mode, BinsWithoutSamplesTakeNoMemory) {
             EXPECT_EQ(ModesOf(x, intervals), expected) << intervals;
         }
     const qx::test::HeapProbe probe(0, 1 << 16);
-    constexpr int32_t intervals = std::numeric_limits<int32_t>::max();
-    EXPECT_EQ(ModesOf({0.0, 0.0, 1.0}, intervals), (Values{0.5 * (1.0 / intervals)}));
+    constexpr int32_t most = std::numeric_limits<int32_t>::max() / 8;
+    EXPECT_EQ(ModesOf({0.0, 0.0, 1.0}, most), (Values{0.5 * (1.0 / most)}));
+    ModesOf({0.0, 0.0, 1.0}, most + 1, ErrOutOfMemory);
 }
 
 } // namespace
