@@ -79,6 +79,8 @@ Outcome FitMatrix(In<DBL2D> h, In<DBL1D> y, In<DBL1D> w, int32_t algorithm, int3
     const int32_t k = h.cols(), side = wantCovariance != 0 ? k : 0;
     if (y.size() != h.rows() || !WeightsFit(w, y.size()))
         return ErrSizeMismatch;
+    if (side > h.rows()) // before a covariance is sized that would be larger than all data
+        return ErrPolynomialOrderTooHigh;
     if (const Outcome bad = coefficients.resize(k))
         return bad;
     if (const Outcome bad = fit.resize(y.size()))

@@ -301,6 +301,9 @@ TEST(LinearFits, ChecksOfMatricesOfTerms) {
     EXPECT_EQ(code(problem.rows, problem.y, {1, 2}, 0), ErrSizeMismatch);
     EXPECT_EQ(code({{}, {}}, {1, 2}, {}, 9), ErrOrderNotPositive);
     EXPECT_EQ(code({{1, 2}}, {1}, {}, 9), ErrPolynomialOrderTooHigh);
+    EXPECT_EQ(FitRows(GenLSFit80_head, {Samples(20000, 1.0)}, {1}, {}, 0, 1).code,
+              ErrPolynomialOrderTooHigh)
+        << "and not for lack of memory for a covariance";
     EXPECT_EQ(code(problem.rows, problem.y, {}, 7), ErrInvalidSelector);
     EXPECT_EQ(code(problem.rows, problem.y, {}, -1), ErrInvalidSelector);
     Problem broken = problem;

@@ -70,8 +70,9 @@ public:
     };
     InOutStream(Words words) : words_(words) {}
 
-    // The state for windows of w samples, with its pointers into the buffer as it stands now.
-    Outcome open(int32_t w, bool isFirst, PeakDState *&state) {
+    // The state for windows of w samples, with its pointers into the buffer as it stands now. A
+    // first block of n samples has at least a window of them: the buffer grows for no other.
+    Outcome open(int32_t w, bool isFirst, int32_t n, PeakDState *&state) {
         state = words_.state;
         const int64_t length = PeakBufferLength(w);
         if (isFirst) {
@@ -81,6 +82,8 @@ public:
                 return 0; // which the step refuses
             if (length > std::numeric_limits<int32_t>::max())
                 return ErrOutOfMemory;
+            if (n < w)
+                return ErrWidthOutOfRange;
             if (const Outcome bad =
                     InOut<DBL1D>(*words_.buffer).resize(static_cast<int32_t>(length)))
                 return bad.code();
@@ -149,14 +152,11 @@ Outcome Peaks(DBL1D source, InOutRequest request, InOutStream stream, int32_t mo
         return bad;
 
     const bool isFirst = (request->flags & QXPeakFirstBlock) != 0;
-    // Before the buffer takes memory for a window that the block cannot fill.
-    const int32_t n = mode == flatSourceCopy ? scanned.size() : request.data().size();
-    if (isFirst && n < w)
-        return ErrWidthOutOfRange;
     const bool isLast = (request->flags & QXPeakLastBlock) != 0;
     const bool ofValleys = request->polarity == 1;
     PeakDState *state = nullptr;
-    if (const Outcome bad = stream.open(w, isFirst, state))
+    const int32_t n = mode == flatSourceCopy ? scanned.size() : request.data().size();
+    if (const Outcome bad = stream.open(w, isFirst, n, state))
         return bad;
     if (mode != flatSourceCopy)
         scanned.showOf(request.data());

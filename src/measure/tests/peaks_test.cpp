@@ -418,7 +418,11 @@ TEST(PeakD, EveryFailureReleasesTheStream) {
     EXPECT_EQ(Stream(5, 0, 0, 3).put(x, whole), ErrInvalidSelector);
     EXPECT_EQ(Stream(5).put({1, 2, 3, 4}, whole), ErrWidthOutOfRange);
     EXPECT_EQ(Stream(5).put(x, 0), ErrStateSizeMismatch) << "a stream that was never begun";
-    EXPECT_EQ(Stream(1 << 29).put(x, whole), ErrWidthOutOfRange) << "no buffer is asked for";
+    EXPECT_EQ(Stream(1 << 29).put(x, whole), ErrOutOfMemory) << "more than an array can have";
+    qx::test::ResetHost();
+    EXPECT_EQ(Stream(100000).put(x, whole), ErrWidthOutOfRange);
+    for (const qx::test::Reshape &reshape : qx::test::Host().reshapes)
+        EXPECT_LE(reshape.count, 20) << "a buffer is asked for";
     {
         Stream stream(5);
         stream.hasBuffer = false;
