@@ -17,7 +17,10 @@
    done; a step takes time in proportion to the samples, by bisquare twice and more, and with a
    tolerance that they cannot reach the steps go on to the limit. guess holds start values for the
    coefficients; where it is empty or too short the fit makes its own. The function result is the
-   code. A failure makes numbers NaN, *iterations 0 and y empty. */
+   code. A failure makes numbers NaN, *iterations 0 and y empty.
+
+   An mse beyond the range of numbers, as for y from 1e154 on, is infinite or NaN, with the code 0,
+   of a line and a logarithm; the other models refuse it. */
 
 #include "qx/types.h"
 

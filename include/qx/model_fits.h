@@ -22,8 +22,8 @@ QX_BEGIN_DECLS
     logarithm; its values take the place of y. Samples without the sign of most do not count. The
     weights are 1 / sd^2, and 1 where sd is 0. Where the x that count are all equal, no exponential
     is determined: rounding decides between those through the mean of ln |y|, and most are so steep
-    that a or b is infinite or 0 and the values are infinite or NaN, with the code 0. The same holds
-    for x below 1e-305.
+    that a or b is infinite or 0 and the values are infinite or NaN, with the code 0. b overflows,
+    too, where the x lie within some 1e-306.
     Codes: ErrSizeMismatch (the arrays differ in length), ErrFewerThanTwo (less than two samples),
     ErrNonFiniteInput (a weight is NaN, or a sample not finite), ErrTooFewWeights (all weights but
     one are 0), ErrPolynomialOrderTooHigh (less than two values have the sign of most),
@@ -76,9 +76,9 @@ QX_API ErrorCode PowerFitCoef_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, 
 /** y = a log(b x) to the given base, for x of one sign, which b takes; its values take the place of
     y. In closed form by the line through (log |x|, y). The base 2.71828, these six digits, stands
     for e; e in all its digits is a base like any other and differs in the last bits. Where all x
-    are equal, and with a base of 1, a and b are NaN, infinite or left to rounding, with the code 0.
-    Where y hardly depends on x, b is the base to a power that overflows to infinity or vanishes,
-    and the values are infinite.
+    are equal, and with a base of 1, a and b are NaN, infinite or arbitrary, with the code 0. Where
+    y hardly depends on x, b is the base to a power that overflows to infinity or vanishes, and the
+    values are infinite.
     Codes: ErrSizeMismatch (the arrays differ in length), ErrNotStrictlyPositive (the base is 0 or
     below), ErrFewerThanTwo (less than two samples), ErrNonFiniteInput (a weight is NaN),
     ErrTooFewWeights (all weights but one are 0), ErrMixedSigns (the x are neither all above nor all

@@ -71,7 +71,7 @@ QX_API ErrorCode StateLevels_IDP(QX_IN DBL1D y, double t0, double dt, int32_t me
     crossing of the period may be missing; period and dutyCycle are then 0, as they always are with
     it. Levels are computed only for references in percent, which come out as absolute values. The
     crossings are found as sample numbers plus t0, so a t0 far beyond the number of samples costs
-    digits, and from about 1e16 on duration and period are 0 and dutyCycle is NaN.
+    digits, and beyond some 1e16 times that number duration and period are 0 and dutyCycle is NaN.
     Codes: ErrMeasureNullState (a pointer is null), ErrMeasureEmptyChannel (bins below 1),
     ErrMeasureTooManyChannels (unknown method), ErrOutOfMemory (no memory for the counters),
     ErrMeasureBadCount (pulseNumber below 1), ErrMeasureEmpty (y is empty), ErrMeasureLevelsReversed
