@@ -5,6 +5,7 @@
 
    Unless noted the function result is 0 and the code stands in *err; a failure sets a numeric
    result to NaN and empties arrays. Input arrays are never changed.
+
    Sums, squares and powers are not kept from overflow: where one passes the largest number,
    1.8e308, the result is infinite, or NaN where infinities of both signs meet, with the code 0. */
 

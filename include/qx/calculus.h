@@ -15,8 +15,8 @@
    M. Abramowitz and I. A. Stegun, "Handbook of mathematical functions", 1964, chapter 25, has the
    rules.
 
-   Values are not watched for overflow: sums of samples near the end of the range, and quotients by a
-   step near 0, become infinite or NaN with the code 0. */
+   Overflow is not looked for: sums of samples near the end of the range, and quotients by a step
+   near 0, become infinite or NaN, with the code 0. */
 
 #include "qx/types.h"
 

@@ -4,6 +4,7 @@
 /* Reading values between the points of a table: by the polynomial through all of them, by a
    rational function through all of them, and by a cubic spline. The function result is 0 and the
    code stands in *err, unless noted. A failure makes numbers NaN and empties arrays.
+
    Differences, quotients and products that leave the range of numbers are not looked for: the
    result is then infinite or NaN, with the code 0. That takes values or slopes near 1e308,
    abscissae closer than about 1e-154 or farther apart than 1e100, or an *xi as far beyond the

@@ -6,6 +6,7 @@
    squared error (MSE) is the sum of |w| (y - fit)^2 over the number of samples, formed as
    y^2 + (fit - 2 y) fit, so that a fit without residuals may leave one of the size of 2.2e-16 times
    y^2 of either sign. A failure empties the arrays and makes the numbers NaN.
+
    Overflow is not looked for: coefficients and values that pass the largest number become infinite
    or NaN, with the code 0. The MSE does so for y from 1e154 on, covariances for columns of H below
    1e-154. */

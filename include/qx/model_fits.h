@@ -10,6 +10,7 @@
    that it cannot reach a fit makes as many as the limit allows. A guess has one value for each
    coefficient; of a longer one the first values count, a shorter one counts as none, and both give
    a warning. A failure empties y where it is an output and makes the numbers NaN.
+
    Overflow is not looked for: where a coefficient or a value of the model passes the largest
    number, as with the exponential of 710, it is infinite and what depends on it infinite or NaN,
    with the code 0. The MSE is so for y from 1e154 on. */

@@ -13,6 +13,7 @@
 
    The counters take 4 bytes a bin for as long as the slot holds them, and every call that finds
    levels by histogram or automatically clears and scans them all, however short the waveform is.
+
    NaN belongs to no state. Numeric results are 0 after a failure. Times that pass the largest
    number, as with a dt near 1e308, are infinite or NaN, with the code 0, and so is a slew rate by a
    dt near 0. `limit` is 0 or 1: with 1 the automatic method takes both levels from the histogram or

@@ -3,7 +3,11 @@
 
 /* Bessel functions and their kin. NaN in gives NaN. docs/accuracy has the measured errors. The
    numbers of formulas are those of M. Abramowitz and I. A. Stegun, Handbook of mathematical
-   functions, 1964. */
+   functions, 1964.
+
+   A function that passes the largest number is infinite where its sign is known, else NaN: ber and
+   bei are from |x| = 1020 or so on, the parabolic cylinder functions for orders from a few hundred
+   on. I, ker and kei may be NaN for arguments beyond 1e154 with orders in the thousands or more. */
 
 #include "qx/types.h"
 

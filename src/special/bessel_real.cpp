@@ -249,6 +249,8 @@ double SphericalBesselJ(int32_t n, double x) {
     const double order = n + 0.5;
     if (order < kLowestOrder)
         return kNaN;
+    if (n >= 0 && std::isinf(kHalfPi / x))
+        return n == 0 ? 1 : 0;
     return std::sqrt(kHalfPi / x) * NonIntegerJ(order, x);
 }
 
@@ -259,6 +261,8 @@ double SphericalBesselY(int32_t n, double x) {
         return -kInfinity;
     if (std::isinf(x))
         return 0;
+    if (n < 0 && n + 0.5 >= kLowestOrder && std::isinf(kHalfPi / x))
+        return n == -1 ? 1 : 0; // up to the sign j of order -n - 1
     return std::sqrt(kHalfPi / x) * BesselY(n + 0.5, x);
 }
 

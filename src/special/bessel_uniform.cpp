@@ -27,6 +27,8 @@ void DebyeTerms(double order, double t, double square, Term term) {
 
 // x < order: J falls and Y grows by exp(order (alpha - tanh alpha)), order / x = cosh alpha.
 OscillatingPair Monotone(double order, double x) {
+    if (order > 1e153) // the squares below would overflow
+        return {0, -kInfinity};
     const double s = std::sqrt((order - x) * (order + x)); // order tanh(alpha)
     const double alpha = std::log1p((s + (order - x)) / x);
     const double exponent = order * alpha - s;
