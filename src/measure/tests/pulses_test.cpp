@@ -431,10 +431,10 @@ TEST(Pulses, ReferencesMayBeAbsolute) {
     EXPECT_EQ(node.pulse({}, 1, 1).status, ErrMeasureEmpty);
     EXPECT_EQ(node.pulse(y, 2, 1).status, ErrInvalidSelector);
     EXPECT_EQ(node.pulse(y, 1, 1, 0, 2).status, ErrInvalidSelector);
-    // Of crossings that there cannot be no memory is taken.
-    for (const int32_t number : {1000000, std::numeric_limits<int32_t>::max()}) {
+    EXPECT_EQ(node.pulse(y, 1, std::numeric_limits<int32_t>::max()).status, ErrMeasureOutOfMemory);
+    { // of crossings that there cannot be no memory is taken
         const HeapProbe probe(0, 1 << 16);
-        EXPECT_EQ(node.pulse(y, 1, number).status, ErrMeasureSearchShort);
+        EXPECT_EQ(node.pulse(y, 1, 1000000).status, ErrMeasureSearchShort);
     }
     node.dt = -1;
     EXPECT_EQ(node.pulse(y, 1, 1).status, ErrMeasureLevelsReversed);
@@ -596,9 +596,11 @@ TEST(Transitions, RefuseWhatHasNone) {
     node.ref = {0.5, 0.5, 0.5, 0};
     EXPECT_EQ(node.transition(y, 1, 1).status, ErrMeasureRangeReversed);
     node.ref = {0.9, 0.5, 0.1, 0};
-    for (const int32_t number : {1000000, std::numeric_limits<int32_t>::max()}) {
+    EXPECT_EQ(node.transition(y, 1, std::numeric_limits<int32_t>::max()).status,
+              ErrMeasureOutOfMemory);
+    {
         const HeapProbe probe(0, 1 << 16);
-        EXPECT_EQ(node.transition(y, 1, number).status, ErrMeasureTooFewPoints);
+        EXPECT_EQ(node.transition(y, 1, 1000000).status, ErrMeasureTooFewPoints);
     }
     node.hist = {QXLevelsByHistogram, 1};
     EXPECT_EQ(node.transition(y, 1, 1).status, ErrMeasureNotPositive) << "one bin has both states";
