@@ -5,22 +5,32 @@ import os
 import sys
 
 from .commands import add_all
+from .interruption import Watch, end, told
 
 EXIT_WRONG = 2
+EXAMPLES = """\
+examples:
+  python3 -m qx report examples/data/ecg_208_360hz.csv
+  python3 -m qx list variance
+
+python3 -m qx COMMAND --help has the options and examples of a command."""
 
 
-def arguments(argv):
-    parser = argparse.ArgumentParser(prog="python3 -m qx", description="The analysis library.")
+def parser():
+    parser = argparse.ArgumentParser(prog="python3 -m qx", description="The analysis library.",
+                                     epilog=EXAMPLES,
+                                     formatter_class=argparse.RawDescriptionHelpFormatter)
     add_all(parser.add_subparsers(dest="command", required=True))
-    return parser.parse_args(argv)
+    return parser
 
 
 def main(argv=None):
-    options = arguments(argv)
+    options = parser().parse_args(argv)
     for stream in (sys.stdout, sys.stderr):
         stream.reconfigure(errors="replace")
     try:
         options.run(options)
+        sys.stdout.flush()
     except BrokenPipeError:
         os.dup2(os.open(os.devnull, os.O_WRONLY), sys.stdout.fileno())
     except Exception as error:  # every failure is one line for the user
@@ -32,5 +42,16 @@ def main(argv=None):
     return 0
 
 
+def run():
+    """main() for a process of its own."""
+    with Watch() as watch:
+        try:
+            return main()
+        except KeyboardInterrupt:
+            watch.ended.set()
+            told()
+            end()
+
+
 if __name__ == "__main__":
-    sys.exit(main())
+    sys.exit(run())

@@ -65,6 +65,22 @@ def cascade(a, b, form):
             zip(np.reshape(b, (-1, order + 1)), np.reshape(a, (-1, order)))]
 
 
+def check_edges(kind, edges, rate):
+    """Refuses what no filter can have, in words that the edges were given in."""
+    half = rate / 2
+    unit = " Hz" if rate != 1 else ""
+    for edge, following in zip(edges, edges[1:]):
+        if not edge < following:
+            raise ValueError(f"the edges are in the wrong order: {edge:g} comes before {following:g}; "
+                             "they must ascend")
+    highest = edges[-1]
+    alone = kind in ("lowpass", "highpass") and len(edges) == 1
+    if highest > half or alone and highest == half:
+        relation = "is not below" if highest == half else "is above"
+        raise ValueError(f"the edge {highest:g}{unit} {relation} half the sampling rate, {half:g}{unit}"
+                         + ("; without --rate the edges are in cycles per sample" if rate == 1 else ""))
+
+
 def edges_of(kind, edges):
     """fl and fh; a lowpass and a highpass take no notice of the second."""
     needed = 1 if kind in ("lowpass", "highpass") else 2

@@ -2,11 +2,10 @@
 
 import html
 import math
-import os
 
 import numpy as np
 
-from . import report
+from . import outputs, report
 
 POINTS = 4000
 FLOOR = -200.0  # dB
@@ -16,9 +15,7 @@ def write(filter_, title, rate, path):
     """Writes the page and gives the lines for the terminal."""
     frequencies = np.linspace(0, 0.5, POINTS + 1)
     section = described(filter_, frequencies, rate)
-    os.makedirs(os.path.dirname(path) or ".", exist_ok=True)
-    with open(path, "w", encoding="utf-8") as file:
-        file.write(page(title, section))
+    outputs.write_text(path, page(title, section))
     lines = [title, ""]
     wide = max(len(row.label) for row in section.rows)
     lines += [f"  {row.label:<{wide}}  {row.value} {row.unit}".rstrip() for row in section.rows]
@@ -31,7 +28,7 @@ def page(title, section):
                    for row in section.rows)
     figures = "".join(f"<figure>{figure}</figure>" for figure in section.figures)
     return (f'<!DOCTYPE html>\n<html lang="en"><head><meta charset="utf-8">'
-            f'<meta name="viewport" content="width=device-width"><title>{html.escape(title)}</title>'
+            f'<meta name="viewport" content="width=device-width">{outputs.generator("design")}<title>{html.escape(title)}</title>'
             f"<style>{report.COMMON_STYLE} td {{ padding: .1em 1.2em .1em 0; }}</style></head><body>"
             f"<h1>{html.escape(title)}</h1>{figures}<table>{rows}</table></body></html>\n")
 

@@ -7,7 +7,7 @@ from collections.abc import Callable
 
 import numpy as np
 
-from . import recording, tables
+from . import outputs, recording, tables
 from .calls import call
 from .tables import InputError
 
@@ -218,8 +218,8 @@ def plot(result, path):
     below.plot(columns.x[order], result.residuals[order], "." if dense else ".-", color=report.WARM,
                linewidth=0.7, markersize=2 if dense else 4)
     below.set(xlabel=columns.x_label, ylabel="residual")
-    folder = os.path.dirname(path)
-    if folder:
-        os.makedirs(folder, exist_ok=True)
-    figure.savefig(path)
+    os.makedirs(os.path.dirname(path) or ".", exist_ok=True)
+    marked = {"metadata": {"Creator": outputs.mark("fit")}} if path.lower().endswith(".svg") else {}
+    with outputs.whole(path) as part:
+        figure.savefig(part, **marked)
     plt.close(figure)

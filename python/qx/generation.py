@@ -2,6 +2,7 @@
 
 import numpy as np
 
+from . import outputs
 from .calls import call
 
 STATE = {"s1": 0, "s2": 0, "s3": 0}  # every seed restarts the stream
@@ -47,8 +48,18 @@ SIGNALS = {
 }
 
 
+# What has a frequency, by the options that say it.
+FREQUENCIES = {**dict.fromkeys(("sine", "square", "triangle", "sawtooth", "sinc", "gauss-pulse", "monopulse"),
+                               ("frequency",)), "chirp": ("frequency", "to")}
+
+
 def generate(options):
     """The samples that the options of the command ask for."""
+    for name in FREQUENCIES.get(options.signal, ()):
+        frequency = getattr(options, name)
+        if abs(frequency) > options.rate / 2:
+            raise ValueError(f"--{name} {frequency:g} Hz is above half the sampling rate, "
+                             f"{options.rate / 2:g} Hz (--rate)")
     n = round(options.seconds * options.rate)
     return SIGNALS[options.signal](n, options)
 
@@ -58,12 +69,14 @@ def write(path, samples, rate):
     ending = path.lower().rpartition(".")[2]
     if ending == "csv":
         times = np.arange(len(samples)) / rate
-        np.savetxt(path, np.column_stack([times, samples]), "%.17g", ",",
-                   header="time [s],x", comments="")
+        with outputs.whole(path) as part:
+            np.savetxt(part, np.column_stack([times, samples]), "%.17g", ",",
+                       header="time [s],x", comments="")
     elif ending == "wav":
         import soundfile
         if rate != int(rate):
             raise ValueError(f"a WAV file needs a whole number of samples per second, not {rate}")
-        soundfile.write(path, samples, int(rate), "FLOAT")
+        with outputs.whole(path) as part:
+            soundfile.write(part, samples, int(rate), "FLOAT", format="WAV")
     else:
         raise ValueError(f"{path}: the name must end in .csv or .wav")

@@ -3,13 +3,17 @@ processes of this machine, or to the workers of a Dask scheduler, and a recordin
 costs its own line and nothing else."""
 
 import concurrent.futures
+import contextlib
 import dataclasses
 import glob
 import html
 import multiprocessing
 import os
+import signal
+import threading
 from pathlib import Path
 
+from . import outputs
 from .audio import ENDINGS as AUDIO
 from .tables import InputError
 
@@ -49,7 +53,7 @@ def files_of(paths):
             found[given] = Path(given)
     named = {path: "_".join(part for part in name.parts if part not in ("/", ".."))
              for path, name in found.items()}
-    pairs, seen = [], {}
+    pairs, seen = [], {"index": 1}  # whose page is another
     for path, name in sorted(named.items(), key=lambda pair: (pair[1], pair[0])):
         seen[name] = seen.get(name, 0) + 1
         pairs.append((name if seen[name] == 1 else f"{name} ({seen[name]})", path))
@@ -72,8 +76,42 @@ def report_on(name, path, options):
         return Outcome(name, failure=f"{path}: {type(error).__name__}: {error}")
 
 
+@contextlib.contextmanager
 def _local(workers):
-    return concurrent.futures.ProcessPoolExecutor(workers, multiprocessing.get_context("spawn"))
+    """Processes that end at once where the work is interrupted, and where this process ends, in
+    whatever way: each watches a pipe whose other end is held here."""
+    context = multiprocessing.get_context("spawn")
+    watched, held = context.Pipe(duplex=False)
+    with watched, held:
+        executor = concurrent.futures.ProcessPoolExecutor(workers, context, _end_with, (watched,))
+        try:
+            yield executor
+        except BaseException:
+            held.close()
+            executor.shutdown(wait=False, cancel_futures=True)
+            raise
+        executor.shutdown()
+
+
+def _end_with(watched):
+    """Runs in a worker: ends it when the other end of the pipe is closed."""
+    def wait():
+        with contextlib.suppress(EOFError, OSError):
+            watched.recv()
+        os._exit(1)
+
+    threading.Thread(target=wait, daemon=True).start()
+
+
+@contextlib.contextmanager
+def _without_interruption():
+    """Processes that are started meanwhile take no notice of Ctrl-C: it is for this one, and reaches
+    it afterwards."""
+    before = signal.pthread_sigmask(signal.SIG_BLOCK, {signal.SIGINT})
+    try:
+        yield
+    finally:
+        signal.pthread_sigmask(signal.SIG_SETMASK, before)
 
 
 def outcomes(pairs, options, workers=None, scheduler=None):
@@ -95,7 +133,8 @@ def outcomes(pairs, options, workers=None, scheduler=None):
 
 
 def _finished(executor, pairs, options, left):
-    waiting = {executor.submit(report_on, name, path, options): (name, path) for name, path in pairs}
+    with _without_interruption():
+        waiting = {executor.submit(report_on, name, path, options): (name, path) for name, path in pairs}
     for future in concurrent.futures.as_completed(list(waiting)):
         pair = waiting.pop(future)
         try:
@@ -115,7 +154,7 @@ def index(found):
         for outcome in found if not outcome.failure)
     failed = "".join(f"<li>{escape(outcome.failure)}</li>\n" for outcome in found if outcome.failure)
     read = sum(not outcome.failure for outcome in found)
-    return (f'<!DOCTYPE html>\n<html lang="en"><head>{HEAD}<title>Recordings</title><style>{STYLE}'
+    return (f'<!DOCTYPE html>\n<html lang="en"><head>{HEAD}{outputs.generator("report")}<title>Recordings</title><style>{STYLE}'
             "div.wide { overflow-x: auto; }</style></head><body><h1>Recordings</h1>"
             f"<p>{read} of {len(found)} recordings were read.</p>"
             f'<div class="wide"><table><tr>{header}</tr>\n{rows}</table></div>'
@@ -127,23 +166,30 @@ def _link(name):
     return quote(f"{name}.html")
 
 
-def write(paths, folder, options, workers=None, scheduler=None, tell=lambda outcome: None, start=None):
+def _check(pairs, folder, force):
+    for name in ("index", *(name for name, _ in pairs)):
+        outputs.check(os.path.join(folder, f"{name}.html"), force, "report", [path for _, path in pairs])
+
+
+def write(paths, folder, options, workers=None, scheduler=None, tell=lambda outcome: None, start=None,
+          force=False):
     """Writes the pages and the index; `start` is told how many there are, `tell` each outcome. Gives
     the outcomes in the order of their names."""
     pairs = files_of(paths)
     if not pairs:
         raise InputError(f"{', '.join(paths)}: holds no text table and no audio file")
+    _check(pairs, folder, force)
     if start:
         start(len(pairs))
     os.makedirs(folder, exist_ok=True)
     found = []
     for outcome in outcomes(pairs, options, workers, scheduler):
         if not outcome.failure:
-            Path(folder, f"{outcome.name}.html").write_text(outcome.page, "utf-8")
+            outputs.write_text(os.path.join(folder, f"{outcome.name}.html"), outcome.page)
             outcome.page = ""
         found.append(outcome)
         tell(outcome)
     order = {name: i for i, (name, _) in enumerate(pairs)}
     found.sort(key=lambda outcome: order[outcome.name])
-    Path(folder, "index.html").write_text(index(found), "utf-8")
+    outputs.write_text(os.path.join(folder, "index.html"), index(found))
     return found

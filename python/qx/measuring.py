@@ -24,23 +24,58 @@ class Peaks:
     places: np.ndarray
     values: np.ndarray
     curvatures: np.ndarray  # second derivatives, per sample squared
-    threshold: float
+    prominences: np.ndarray
+    prominence: float  # the least that was asked for
 
 
-def middle_threshold(values, valleys=False):
-    """Half the way from the median to where the outer hundredth of the values begins."""
-    outer = np.quantile(values, 0.01 if valleys else 0.99)
-    return (call("Median_head", values) + outer) / 2
+def prominences(values, places, heights):
+    """The height of each peak above the higher of the lowest values on both sides of it, up to the
+    next higher peak or the end."""
+    if not len(places):
+        return np.zeros(0)
+    cuts = np.clip(np.ceil(places).astype(int), 1, len(values) - 1)
+    lowest = np.minimum.reduceat(values, np.r_[0, cuts])  # before the first, between, behind the last
+    left = _lowest_before(heights, lowest[:-1])
+    right = _lowest_before(heights[::-1], lowest[:0:-1])[::-1]
+    return heights - np.maximum(left, right)
 
 
-def peaks(values, threshold=None, width=5, valleys=False):
-    """The peaks above the threshold, or the valleys below it, by parabolas over `width` samples."""
-    if threshold is None:
-        threshold = middle_threshold(values, valleys)
-    request = {"data": values, "threshold": threshold, "width": width, "polarity": int(valleys),
+def _lowest_before(heights, lowest):
+    """The lowest value between each peak and the last one before it that is higher; `lowest` has that
+    between neighbours."""
+    found, higher = [], []  # peaks to which nothing so far is a higher one: height, lowest before it
+    for height, low in zip(heights.tolist(), lowest.tolist()):
+        while higher and higher[-1][0] <= height:
+            low = min(low, higher.pop()[1])
+        found.append(low)
+        higher.append((height, low))
+    return np.array(found)
+
+
+def outstanding(found):
+    """The prominence from which on peaks count where nobody says it: two fifths of the third greatest,
+    which one or two disturbances do not raise, and at least a fifth of the greatest, since noise is
+    what the third one is beside one or two peaks."""
+    greatest = np.sort(found)[:-4:-1]
+    return max(0.4 * greatest[-1], 0.2 * greatest[0]) if len(greatest) else 0.0
+
+
+def peaks(values, threshold=None, width=5, valleys=False, prominence=None):
+    """The peaks, by parabolas over `width` samples, above the threshold and of this prominence at
+    least, or the valleys below it; with neither of both those of outstanding() prominence."""
+    limit = np.finfo(float).max if valleys else -np.finfo(float).max
+    request = {"data": values, "threshold": limit, "width": width, "polarity": int(valleys),
                "flags": WHOLE_STREAM}
     found = call("PeakD", request, {}, [])[0]
-    return Peaks(found["locations"], found["amplitudes"], found["derivatives"], threshold)
+    sign = -1.0 if valleys else 1.0
+    places, heights = found["locations"], found["amplitudes"]
+    stand = prominences(sign * values, places, sign * heights)
+    if prominence is None:
+        prominence = outstanding(stand) if threshold is None else -np.inf
+    kept = stand >= prominence
+    if threshold is not None:
+        kept &= sign * heights > sign * threshold
+    return Peaks(places[kept], heights[kept], found["derivatives"][kept], stand[kept], prominence)
 
 
 # Events

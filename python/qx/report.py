@@ -9,13 +9,13 @@ import dataclasses
 import html
 import io
 import math
-import os
 import textwrap
 import warnings
 from datetime import datetime, timezone
 
 import numpy as np
 
+from . import outputs
 from .calls import call
 from .outcomes import QxError
 
@@ -411,7 +411,7 @@ table + figure { margin-top: 1em; } footer { margin-top: 3em; color: var(--quiet
 def page(recording, sections):
     escape = html.escape
     title = recording.name
-    out = ["<!DOCTYPE html>", f'<html lang="en"><head>{HEAD}',
+    out = ["<!DOCTYPE html>", f'<html lang="en"><head>{HEAD}{outputs.generator("report")}',
            f"<title>{escape(title)}</title><style>{STYLE}</style></head><body>",
            f"<h1>{escape(title)}</h1>"]
     if recording.choice:
@@ -462,9 +462,5 @@ def sections_of(recording):
 def write(recording, path):
     """Writes the page and gives the lines for the terminal."""
     sections = sections_of(recording)
-    folder = os.path.dirname(path)
-    if folder:
-        os.makedirs(folder, exist_ok=True)
-    with open(path, "w", encoding="utf-8") as file:
-        file.write(page(recording, sections))
+    outputs.write_text(path, page(recording, sections))
     return list(lines(recording, sections))

@@ -6,12 +6,17 @@ import os
 import numpy as np
 import soundfile
 
+from . import outputs
 from .calls import call
 
 ATTENUATION = 123.0  # dB by the estimate, 122 by the spectrum of the taps, of what would fold back
 PASSBAND = 0.9  # the part of the lower band that passes unchanged
 FRAMES_AT_ONCE = 1 << 15
 LARGEST_FACTOR = 1 << 17  # beyond it the taps fill the memory
+FORMATS = {".wav": "WAV", ".wave": "WAV", ".flac": "FLAC", ".aif": "AIFF", ".aiff": "AIFF",
+           ".w64": "W64", ".rf64": "RF64"}
+BYTES_OF_32 = 2**32 - 2**16  # where files end that have their length in 32 bits
+REALS = ("FLOAT", "DOUBLE")  # sample formats that hold what lies beyond full scale
 SAMPLE_BYTES = {"PCM_U8": 1, "PCM_16": 2, "PCM_24": 3, "PCM_32": 4, "FLOAT": 4}
 
 
@@ -39,6 +44,7 @@ class Resampler:
         self.taps = low_pass(self.up, self.down, **design)
         self.channels = channels
         self.read = self.written = 0
+        self.clipped, self.highest, self.format_note = 0, 0.0, ""
         self.reset, self.offset, self.count, self.state = 1, 0, 0, np.zeros((0, 0))
 
     def put(self, frames):
@@ -73,26 +79,49 @@ def opened(path):
         raise OSError(f"{path}: cannot be read as audio: {reason}") from None
 
 
-def resample_file(source, target, rate, progress=lambda frames: None):
-    """Writes the sound of the open file `source` to `target`, a WAV file in the same sample format,
-    which appears when it is whole; `progress` is told of frames as they are read. The stream that
-    did it is the result."""
-    resampler = Resampler(source.samplerate, rate, source.channels)
+def format_for(target, source, rate):
+    """The format and the sample format of the new file; a ValueError where there is none."""
+    ending = os.path.splitext(target)[1].lower()
+    if ending not in FORMATS:
+        raise ValueError(f"{target}: the name must end in one of {', '.join(FORMATS)}")
+    kind = FORMATS[ending]
     bytes_due = (source.frames * rate / source.samplerate * source.channels
                  * SAMPLE_BYTES.get(source.subtype, 8))
-    kind = "RF64" if bytes_due > 2**32 - 2**16 else "WAV"  # where a plain WAV file ends
-    subtype = source.subtype if soundfile.check_format(kind, source.subtype) else None
-    part = f"{target}.part"
+    if bytes_due > BYTES_OF_32 and kind in ("WAV", "AIFF"):
+        if kind == "AIFF":
+            raise ValueError(f"{target}: an AIFF file cannot be so long; .w64 and .rf64 can")
+        kind = "RF64"
+    if soundfile.check_format(kind, source.subtype):
+        return kind, source.subtype
+    # FLAC has no more than 24 bits; what is lost otherwise is a coding, such as that of Vorbis.
+    return kind, "PCM_24" if SAMPLE_BYTES.get(source.subtype, 0) > 2 or source.subtype in REALS else "PCM_16"
+
+
+def resample_file(source, target, rate, progress=lambda frames: None):
+    """Writes the sound of the open file `source` to `target`, in the format that its ending names and
+    the same sample format if that has it; the file appears when it is whole. `progress` is told of
+    frames as they are read. The stream that did it is the result: `clipped` samples were beyond full
+    scale, the farthest at `highest` times that."""
+    resampler = Resampler(source.samplerate, rate, source.channels)
+    kind, subtype = format_for(target, source, rate)
+    if subtype != source.subtype:
+        resampler.format_note = f", {subtype} in place of {source.subtype}"
+
+    def put(out, frames):
+        if subtype not in REALS:
+            beyond = np.abs(frames).max(initial=0)
+            if beyond > 1:
+                resampler.clipped += int(np.count_nonzero(np.abs(frames) > 1))
+                resampler.highest = max(resampler.highest, float(beyond))
+        out.write(frames)
+
     try:
-        with soundfile.SoundFile(part, "w", rate, source.channels, subtype, format=kind) as out:
+        with outputs.whole(target) as part, \
+                soundfile.SoundFile(part, "w", rate, source.channels, subtype, format=kind) as out:
             while len(frames := source.read(FRAMES_AT_ONCE, always_2d=True)):
-                out.write(resampler.put(frames))
+                put(out, resampler.put(frames))
                 progress(len(frames))
-            out.write(resampler.end())
-        os.replace(part, target)
-    except soundfile.SoundFileError as error:
-        raise OSError(f"{target}: cannot be written: {error}") from None
-    finally:
-        if os.path.exists(part):
-            os.remove(part)
+            put(out, resampler.end())
+    except (soundfile.SoundFileError, OSError) as error:
+        raise OSError(f"{target}: cannot be written: {getattr(error, 'strerror', None) or error}") from None
     return resampler

@@ -30,7 +30,7 @@ class Generating(unittest.TestCase):
 
     def generated(self, signal, *options):
         path = self.folder / "out.csv"
-        code, text = self.run_command(signal, path, "--rate", 2000, "--seconds", 0.5, *options)
+        code, text = self.run_command(signal, path, "--rate", 2000, "--seconds", 0.5, "--force", *options)
         self.assertEqual(code, 0, text)
         times, samples = np.loadtxt(path, delimiter=",", skiprows=1).T
         np.testing.assert_allclose(times, np.arange(1000) / 2000, atol=1e-15)

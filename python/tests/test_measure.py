@@ -114,7 +114,8 @@ class Commands(unittest.TestCase):
         self.assertIn("58 events", ran.stdout)
         head, rows = self.written()
         self.assertEqual((head, rows.shape), (["time (s)", "mV"], (58, 2)))
-        ran = self.run_command("peaks", RECORDING, "--threshold", "1.2", "--width", "9", "--csv", self.table)
+        ran = self.run_command("peaks", RECORDING, "--threshold", "1.2", "--width", "9", "--csv", self.table,
+                               "--force")
         head, rows = self.written()
         self.assertGreater(rows[:, 1].min(), 1.2)
         self.assertGreater(len(rows), 20)

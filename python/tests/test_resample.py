@@ -44,7 +44,7 @@ class Resample(unittest.TestCase):
             with self.subTest(rate=rate, new_rate=new_rate):
                 frequency = 0.4 * min(rate, new_rate)
                 soundfile.write(self.source, tone(frequency, rate, n), rate, "DOUBLE")
-                ran = self.command(self.source, self.target, "--rate", str(new_rate))
+                ran = self.command(self.source, self.target, "--rate", str(new_rate), "--force")
                 self.assertEqual(ran.stderr, "")
                 sound, found_rate = soundfile.read(self.target)
                 self.assertEqual(found_rate, new_rate)

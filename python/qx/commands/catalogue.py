@@ -2,6 +2,18 @@
 
 import textwrap
 
+from .values import add_command
+
+LIST_EXAMPLES = """\
+examples:
+  python3 -m qx list variance
+  python3 -m qx list "Bessel*"
+  python3 -m qx list peaks stream"""
+
+SHOW_EXAMPLES = """\
+examples:
+  python3 -m qx show Moment_head"""
+
 
 def list_exports(options):
     from ..catalogue import find, summary
@@ -40,9 +52,9 @@ def show_export(options):
 
 
 def add(commands):
-    command = commands.add_parser("list", help="finds exports by words in name and text")
+    command = add_command(commands, "list", LIST_EXAMPLES, help="finds exports by words in name and text")
     command.add_argument("pattern", nargs="*", help="words, or a name with * and ?")
     command.set_defaults(run=list_exports)
-    command = commands.add_parser("show", help="declaration and documentation of an export")
+    command = add_command(commands, "show", SHOW_EXAMPLES, help="declaration and documentation of an export")
     command.add_argument("name")
     command.set_defaults(run=show_export)

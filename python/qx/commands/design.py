@@ -1,18 +1,21 @@
 """The command design."""
 
-import argparse
 import json
 import os
 
-from .values import positive
+from ..outputs import add_force
+from .values import add_command, positive
 
 EXAMPLES = """\
 examples:
-  qx design butterworth lowpass 40 --rate 360 --order 4
-  qx design elliptic bandstop 48 52 --rate 1000 --order 3 --ripple 0.5 --attenuation 40
-  qx design equiripple bandpass 900 1000 2000 2100 --rate 8000 --taps 121 --weight 10
-  qx design windowed highpass 0.5 --rate 100 --taps 401 --window hamming
-  qx design narrow lowpass 20 25 --rate 8000 --ripple 0.1 --attenuation 60
+  python3 -m qx design butterworth lowpass 40 --rate 360 --order 4
+  python3 -m qx design elliptic bandstop 48 52 --rate 1000 --order 3 --ripple 0.5 --attenuation 40
+  python3 -m qx design equiripple bandpass 900 1000 2000 2100 --rate 8000 --taps 121 --weight 10
+  python3 -m qx design windowed highpass 0.5 --rate 100 --taps 401 --window hamming
+  python3 -m qx design narrow lowpass 20 25 --rate 8000 --ripple 0.1 --attenuation 60
+
+The page and the numbers of an earlier design in the folder are replaced; other files of these names
+only with --force.
 
 edges: one of a lowpass or highpass, two of a bandpass or bandstop; of equiripple and narrow filters
 the edges of pass and stop bands, twice as many, in ascending order."""
@@ -21,7 +24,7 @@ the edges of pass and stop bands, twice as many, in ascending order."""
 def made(options):
     """The Filter, and what of it a program reads."""
     from .. import design
-    kind, edges, rate = options.type, sorted(options.edges), options.rate
+    kind, edges, rate = options.type, options.edges, options.rate
     if options.family in design.FAMILIES:
         form = design.FOURTH_ORDER if options.fourth else design.SECOND_ORDER
         a, b, filter_ = design.iir(options.family, kind, edges, rate, options.order, options.ripple,
@@ -39,26 +42,26 @@ def made(options):
 
 
 def design_filter(options):
-    from .. import design_page
-    filter_, coefficients = made(options)
-    title = f"{options.family.capitalize().replace('-', ' ')} {options.type}"
-    edges = ", ".join(f"{edge:g}" for edge in sorted(options.edges))
+    from .. import design, design_page, outputs
     page = os.path.join(options.output, "design.html")
     numbers = os.path.join(options.output, "design.json")
+    for path in (page, numbers):
+        outputs.check(path, options.force, "design")
+    design.check_edges(options.type, options.edges, options.rate)
+    filter_, coefficients = made(options)
+    title = f"{options.family.capitalize().replace('-', ' ')} {options.type}"
+    edges = ", ".join(f"{edge:g}" for edge in options.edges)
     for line in design_page.write(filter_, f"{title}, {edges} of {options.rate:g}", options.rate, page):
         print(line)
-    with open(numbers, "w", encoding="utf-8") as file:
-        json.dump({"family": options.family, "type": options.type, "rate": options.rate,
-                   "edges": sorted(options.edges), "export": filter_.export, **coefficients}, file,
-                  indent=1)
-        file.write("\n")
+    outputs.write_text(numbers, json.dumps(
+        {"generator": outputs.mark("design"), "family": options.family, "type": options.type,
+         "rate": options.rate, "edges": options.edges, "export": filter_.export, **coefficients},
+        indent=1) + "\n")
     print(f"\nMagnitude, phase and group delay: {page}\nCoefficients: {numbers}")
 
 
 def add(commands):
-    command = commands.add_parser(
-        "design", help="designs a filter and plots what it does", epilog=EXAMPLES,
-        formatter_class=argparse.RawDescriptionHelpFormatter)
+    command = add_command(commands, "design", EXAMPLES, help="designs a filter and plots what it does")
     command.add_argument("family", choices=["butterworth", "chebyshev", "inverse-chebyshev", "elliptic",
                                             "bessel", "windowed", "equiripple", "narrow"])
     command.add_argument("type", choices=["lowpass", "highpass", "bandpass", "bandstop"])
@@ -78,4 +81,5 @@ def add(commands):
     command.add_argument("--weight", type=positive, default=1.0, metavar="W",
                          help="of a deviation in the stop band of equiripple filters (1)")
     command.add_argument("--output", default="out", metavar="FOLDER", help="for the page and the numbers")
+    add_force(command)
     command.set_defaults(run=design_filter)

@@ -2,7 +2,18 @@
 
 import os
 
+from ..outputs import add_force
+from .values import add_command
+
 METHODS = ("squares", "absolute", "bisquare")
+EXAMPLES = """\
+examples:
+  python3 -m qx generate gauss-pulse bells.csv --rate 1000 --delay 0.5 --frequency 20
+  python3 -m qx fit bells.csv --model line
+  python3 -m qx fit bells.csv --model gaussian --fix c=0 --plot bell.svg
+  python3 -m qx fit bells.csv --model polynomial --order 3 --x time --y x --method squares
+
+A drawing of an earlier fit (SVG) is replaced; another file of that name only with --force."""
 
 
 def values(texts):
@@ -18,7 +29,9 @@ def values(texts):
 
 
 def fit(options):
-    from .. import fitting
+    from .. import fitting, outputs
+    path = options.plot or os.path.join("out", "fit.svg")
+    outputs.check(path, options.force, "fit", [options.file])
     model = fitting.model_of(options.model, options.order)
     fixed = values(options.fix)
     told = fitting.Options(METHODS.index(options.method), values(options.guess),
@@ -28,13 +41,12 @@ def fit(options):
     result = fitting.fit(model, columns, told)
     for line in fitting.lines(result):
         print(line)
-    path = options.plot or os.path.join("out", "fit.svg")
     fitting.plot(result, path)
     print(f"Data, fit and residuals: {path}")
 
 
 def add(commands):
-    command = commands.add_parser("fit", help="fits a column of a text table against another")
+    command = add_command(commands, "fit", EXAMPLES, help="fits a column of a text table against another")
     command.add_argument("file")
     command.add_argument("--model", required=True, metavar="MODEL",
                          help="line, polynomial, exponential, power, logarithm or gaussian")
@@ -52,4 +64,5 @@ def add(commands):
     command.add_argument("--decimal", choices=("point", "comma"), help="of the numbers in the table")
     command.add_argument("--missing", choices=("skip",), help="leaves out rows with missing values")
     command.add_argument("--plot", metavar="FILE", help="out/fit.svg by default; .png and .pdf, too")
+    add_force(command)
     command.set_defaults(run=fit)

@@ -2,12 +2,19 @@
 
 import argparse
 
-from .values import positive
+from ..outputs import add_force
+from .values import add_command, positive
 
 # Kept here for the help, so that the libraries are loaded only to generate; a test holds the list to
 # the signals that there are.
 NAMES = ("sine square triangle sawtooth chirp white gauss periodic gamma poisson binomial ramp pulse "
          "impulse sinc gauss-pulse monopulse triangle-pulse").split()
+
+EXAMPLES = """\
+examples:
+  python3 -m qx generate sine tone.wav --frequency 440 --seconds 2
+  python3 -m qx generate chirp sweep.wav --frequency 20 --to 20000 --seconds 5 --amplitude 0.5
+  python3 -m qx generate gauss noise.csv --rate 1000 --seconds 10 --seed 7"""
 
 
 def seed(text):
@@ -18,14 +25,15 @@ def seed(text):
 
 
 def generate(options):
-    from .. import generation
+    from .. import generation, outputs
+    outputs.check(options.target, options.force)
     samples = generation.generate(options)
     generation.write(options.target, samples, options.rate)
     print(f"{options.target}: {len(samples)} samples at {options.rate:g} Hz")
 
 
 def add(commands):
-    command = commands.add_parser("generate", help="writes a wave, a noise or a pulse, CSV or WAV")
+    command = add_command(commands, "generate", EXAMPLES, help="writes a wave, a noise or a pulse, CSV or WAV")
     command.add_argument("signal", choices=NAMES, metavar="SIGNAL", help=", ".join(NAMES))
     command.add_argument("target", metavar="OUT.wav|OUT.csv")
     command.add_argument("--rate", type=positive, default=44100.0, metavar="HZ",
@@ -46,4 +54,5 @@ def add(commands):
     command.add_argument("--mean", type=float, default=1.0, help="of Poisson noise")
     command.add_argument("--trials", type=int, default=1, help="of binomial noise")
     command.add_argument("--probability", type=float, default=0.5, help="of binomial noise")
+    add_force(command)
     command.set_defaults(run=generate)

@@ -2,9 +2,24 @@
 
 import argparse
 
-from .values import positive
+from ..outputs import add_force
+from .values import add_command, positive
 
 SHOWN = 20  # lines of a table on the terminal
+PEAKS_EXAMPLES = """\
+examples:
+  python3 -m qx peaks examples/data/ecg_208_360hz.csv
+  python3 -m qx peaks examples/data/ecg_208_360hz.csv --prominence 0.5 --width 9
+  python3 -m qx peaks examples/data/ecg_208_360hz.csv --threshold 1.2 --csv peaks.csv
+  python3 -m qx peaks examples/data/ecg_208_360hz.csv --events --csv beats.csv
+
+The prominence of a peak is its height above the higher of the two lowest values on either side of it
+before a higher peak, or the end, is reached."""
+PULSE_EXAMPLES = """\
+examples:
+  python3 -m qx generate pulse gate.csv --rate 1000 --delay 0.2 --width 0.3
+  python3 -m qx pulse gate.csv
+  python3 -m qx pulse examples/data/ecg_208_360hz.csv --events --number 2 --csv pulses.csv"""
 
 
 def width(text):
@@ -23,8 +38,12 @@ def number(text):
 
 def write_table(path, names, rows):
     import csv
-    with open(path, "w", newline="", encoding="utf-8") as file:
-        csv.writer(file).writerows([names, *rows])
+    import io
+
+    from .. import outputs
+    text = io.StringIO()
+    csv.writer(text).writerows([names, *rows])
+    outputs.write_text(path, text.getvalue())
     print(f"{path}: {len(rows)} line" + "s" * (len(rows) != 1))
 
 
@@ -38,7 +57,9 @@ def show_table(names, rows):
 
 
 def opened(options):
-    from .. import recording
+    from .. import outputs, recording
+    if options.csv:
+        outputs.check(options.csv, options.force, inputs=[options.file])
     read = recording.read(options.file, rate=options.rate, column=options.column)
     step = 1 / read.rate if read.rate else 1.0
     return read, step
@@ -60,12 +81,19 @@ def peaks(options):
         names = [time, value]
         print(f"{read.name}: {len(rows)} events")
     else:
-        found = measuring.peaks(read.values, options.threshold, options.width, options.valleys)
+        found = measuring.peaks(read.values, options.threshold, options.width, options.valleys,
+                                options.prominence)
         places = found.places
-        rows = list(zip(places * step, found.values, found.curvatures / step**2))
-        names = [time, value, "second derivative"]
-        print(f"{read.name}: {len(rows)} " + ("valleys below" if options.valleys else "peaks above")
-              + f" {found.threshold:.6g} {read.unit}".rstrip())
+        rows = list(zip(places * step, found.values, found.curvatures / step**2, found.prominences))
+        names = [time, value, "second derivative", f"prominence ({read.unit})" if read.unit else "prominence"]
+        said = []
+        if options.threshold is not None:
+            side = "below" if options.valleys else "above"
+            said.append(f"{side} {options.threshold:.6g} {read.unit}".rstrip())
+        if found.prominence > 0:
+            said.append(f"that stand out by {found.prominence:.6g} {read.unit}".rstrip())
+        kind = "valley" if options.valleys else "peak"
+        print(f"{read.name}: {len(rows)} {kind}{'s' * (len(rows) != 1)} {' and '.join(said)}".rstrip())
     if len(places) > 1:
         from ..calls import call
         interval = call("Median_head", places[1:] - places[:-1]) * step
@@ -129,25 +157,28 @@ def add_common(command):
     command.add_argument("--rate", type=positive, metavar="HZ", help="samples per second")
     command.add_argument("--column", metavar="NAME", help="column or channel, a name or a number")
     command.add_argument("--csv", metavar="FILE", help="writes the table there")
+    add_force(command)
 
 
 def add(commands):
-    command = commands.add_parser(
-        "peaks", help="finds the peaks of a recording",
+    command = add_command(
+        commands, "peaks", PEAKS_EXAMPLES, help="finds the peaks of a recording",
         description="Finds peaks, by parabolas through windows of samples, or repeated events.")
     add_common(command)
     command.add_argument("--threshold", type=float, metavar="VALUE",
-                         help="peaks lie above it; by default half way from the median to the outer "
-                         "hundredth of the values")
+                         help="peaks lie above it, valleys below")
+    command.add_argument("--prominence", type=float, metavar="VALUE",
+                         help="peaks stand out by so much at least; without this and --threshold by two "
+                         "fifths of what the third most prominent one does, and by a fifth of the first")
     command.add_argument("--width", type=width, default=5, metavar="SAMPLES",
                          help="of a parabola, 5 by default; wider ones pass over noise")
-    command.add_argument("--valleys", action="store_true", help="seeks valleys, below the threshold")
+    command.add_argument("--valleys", action="store_true", help="seeks valleys instead")
     command.add_argument("--events", action="store_true",
                          help="repeated bursts of steep slope instead, such as heart beats")
     command.set_defaults(run=peaks)
 
-    command = commands.add_parser(
-        "pulse", help="measures a pulse of a recording",
+    command = add_command(
+        commands, "pulse", PULSE_EXAMPLES, help="measures a pulse of a recording",
         description="Measures a pulse between two states: levels, edges, width, overshoot.")
     add_common(command)
     command.add_argument("--number", type=number, default=1, metavar="N",

@@ -4,7 +4,17 @@ import argparse
 import os
 import sys
 
-from .values import positive
+from ..outputs import add_force
+from .values import add_command, positive
+
+EXAMPLES = """\
+examples:
+  python3 -m qx report examples/data/ecg_208_360hz.csv
+  python3 -m qx report examples/data/ecg_208_360hz.csv --start 3600 --output second-part
+  python3 -m qx report examples/data --workers 2 --output many
+  python3 -m qx report "examples/data/*.csv" --rate 360
+
+Pages of an earlier report in the folder are replaced; other files of their names only with --force."""
 
 
 def report_on(options):
@@ -13,8 +23,9 @@ def report_on(options):
                "missing": options.missing, "start": options.start}
     if many.is_many(options.files):
         return report_on_many(options, reading)
-    from .. import recording, report
+    from .. import outputs, recording, report
     path = os.path.join(options.output, "report.html")
+    outputs.check(path, options.force, "report", options.files)
     for line in report.write(recording.read(options.files[0], **reading), path):
         print(line)
     print(f"\nThe report with plots: {path}")
@@ -31,9 +42,14 @@ def report_on_many(options, reading):
             bar.write(f"qx: {outcome.failure}", file=sys.stderr)
         bar.update()
 
-    with bar:
+    try:
         found = many.write([os.fspath(path) for path in options.files], options.output, reading,
-                           options.workers, options.scheduler, tell, bar.reset)
+                           options.workers, options.scheduler, tell, bar.reset, options.force)
+    except BaseException:
+        bar.leave = False
+        raise
+    finally:
+        bar.close()
     read = sum(not outcome.failure for outcome in found)
     print(f"{read} of {len(found)} recordings were read: {os.path.join(options.output, 'index.html')}")
     if not read:
@@ -48,9 +64,10 @@ def count(text):
 
 
 def add(commands):
-    command = commands.add_parser("report", help="analyses recordings, text tables or audio files",
-                                  description="Analyses a recording, or many: each has a page then, and "
-                                  "an index leads to them.")
+    command = add_command(commands, "report", EXAMPLES,
+                          help="analyses recordings, text tables or audio files",
+                          description="Analyses a recording, or many: each has a page then, and "
+                          "an index leads to them.")
     command.add_argument("files", nargs="+", metavar="FILE|FOLDER|PATTERN")
     command.add_argument("--rate", type=positive, metavar="HZ", help="samples per second")
     command.add_argument("--column", metavar="NAME", help="column or channel, a name or a number")
@@ -66,4 +83,5 @@ def add(commands):
     command.add_argument("--scheduler", metavar="ADDRESS",
                          help="of a Dask cluster that is given many recordings; its workers have this "
                          "package and reach the files by the same paths")
+    add_force(command, "replaces files that are no pages of an earlier report")
     command.set_defaults(run=report_on)

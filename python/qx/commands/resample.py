@@ -1,7 +1,21 @@
 """The command resample."""
 
 import argparse
+import math
 import sys
+
+from ..outputs import add_force
+from .values import add_command
+
+EXAMPLES = """\
+examples:
+  python3 -m qx generate sine tone.wav --rate 48000
+  python3 -m qx resample tone.wav tone44.wav --rate 44100
+  python3 -m qx resample tone.wav tone.flac --rate 96000
+
+The ending of the new file says its format: .wav, .flac, .aiff, .w64 or .rf64. It has the sample
+format of the old one where there is such a thing. Samples that the filter takes beyond full scale
+are clipped in formats of whole numbers, and counted."""
 
 
 def rate(text):
@@ -14,7 +28,9 @@ def rate(text):
 def resample(options):
     import tqdm
 
+    from .. import outputs
     from ..resampling import opened, resample_file
+    outputs.check(options.target, options.force, inputs=[options.source])
     with opened(options.source) as source:
         # A file that is done within a second needs no bar.
         with tqdm.tqdm(total=source.frames, unit=" frames", unit_scale=True, delay=1, leave=False,
@@ -22,13 +38,19 @@ def resample(options):
             done = resample_file(source, options.target, options.rate, bar.update)
         print(f"{options.source}: {done.read} frames at {source.samplerate} Hz")
     written = -(-done.read * done.up // done.down)
-    print(f"{options.target}: {written} frames at {options.rate} Hz")
+    print(f"{options.target}: {written} frames at {options.rate} Hz{done.format_note}")
+    if done.clipped:
+        beyond = 20 * math.log10(done.highest)
+        print(f"qx: {options.target}: {done.clipped} sample{'s' * (done.clipped != 1)} beyond full scale, by "
+              f"up to {beyond:.2g} dB, clipped", file=sys.stderr)
 
 
 def add(commands):
-    command = commands.add_parser("resample", help="changes the sampling rate of a WAV file")
-    command.add_argument("source", metavar="IN.wav")
-    command.add_argument("target", metavar="OUT.wav")
+    command = add_command(commands, "resample", EXAMPLES,
+                          help="changes the sampling rate of an audio file")
+    command.add_argument("source", metavar="IN")
+    command.add_argument("target", metavar="OUT")
     command.add_argument("--rate", type=rate, required=True, metavar="HZ",
                          help="samples per second of the new file")
+    add_force(command, "replaces a file that exists; never the one that is read")
     command.set_defaults(run=resample)

@@ -1,4 +1,4 @@
-"""What the options of several commands take."""
+"""What the parsers and options of several commands share."""
 
 import argparse
 
@@ -8,3 +8,11 @@ def positive(text):
     if not 0 < value < float("inf"):
         raise argparse.ArgumentTypeError(f"{text} is not above 0")
     return value
+
+
+def add_command(commands, name, examples, **texts):
+    """The parser of a command, whose help ends with examples as they stand. `texts` has `help`, a
+    line, and `description` where that is not enough."""
+    texts.setdefault("description", texts["help"][:1].upper() + texts["help"][1:] + ".")
+    return commands.add_parser(name, epilog=examples,
+                               formatter_class=argparse.RawDescriptionHelpFormatter, **texts)
