@@ -5,7 +5,7 @@ import os
 import sys
 
 from .commands import add_all
-from .interruption import Watch, end, told
+from .interruption import EXIT, Watch
 
 EXIT_WRONG = 2
 EXAMPLES = """\
@@ -44,13 +44,9 @@ def main(argv=None):
 
 def run():
     """main() for a process of its own."""
-    with Watch() as watch:
-        try:
-            return main()
-        except KeyboardInterrupt:
-            watch.ended.set()
-            told()
-            end()
+    with Watch():
+        return main()
+    return EXIT
 
 
 if __name__ == "__main__":

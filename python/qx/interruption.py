@@ -1,10 +1,11 @@
 """Ctrl-C on the command line: one line, and the process has ended within a second.
 
 The interpreter raises KeyboardInterrupt once the main thread is back from whatever C code it is in,
-which may be long. So a second thread, woken by the signal itself, ends the process where the first
-has not done so in time.
+which may be long, and then all that is open is closed. So a second thread, woken by the signal itself,
+ends the process where that takes too long.
 """
 
+import atexit
 import contextlib
 import os
 import signal
@@ -14,42 +15,50 @@ import threading
 
 from . import outputs
 
-SECONDS = 0.5  # for the main thread to end by itself
-
-
-def end():
-    """Ends the process as the signal does by default, so that a shell's loop ends as well."""
-    outputs.forget_all()
-    signal.signal(signal.SIGINT, signal.SIG_DFL)
-    os.kill(os.getpid(), signal.SIGINT)
-
-
-def told():
-    """The line, on a terminal in place of the ^C that it shows."""
-    start = "\r" if sys.stderr.isatty() else ""
-    with contextlib.suppress(OSError):
-        os.write(2, f"{start}qx: interrupted\n".encode())
+SECONDS = 0.5  # for the process to end by itself
+EXIT = 128 + signal.SIGINT
 
 
 class Watch:
     """While it is entered, an interruption ends the process in time."""
 
+    def __init__(self):
+        self._telling = threading.Lock()
+        self._told = False
+
     def __enter__(self):
-        self.ended = threading.Event()
-        self.receiver, self.sender = socket.socketpair()
-        self.sender.setblocking(False)
-        self.before = signal.set_wakeup_fd(self.sender.fileno(), warn_on_full_buffer=False)
+        self._receiver, self._sender = socket.socketpair()
+        self._sender.setblocking(False)
+        signal.set_wakeup_fd(self._sender.fileno(), warn_on_full_buffer=False)
         threading.Thread(target=self._wait, daemon=True).start()
+        atexit.register(self._end)  # what is registered later runs before
         return self
 
-    def _wait(self):
-        while received := self.receiver.recv(1):
-            if received[0] == signal.SIGINT and not self.ended.wait(SECONDS):
-                outputs.forget_all()
-                told()
-                os.kill(os.getpid(), signal.SIGKILL)
+    def __exit__(self, kind, *_):
+        if kind is not KeyboardInterrupt:
+            return False
+        self._tell()
+        return True
 
-    def __exit__(self, *_):
-        self.ended.set()
-        signal.set_wakeup_fd(self.before)
-        self.sender.close()
+    def _wait(self):
+        with contextlib.suppress(OSError):
+            while self._receiver.recv(1)[0] != signal.SIGINT:
+                pass
+            threading.Event().wait(SECONDS)
+            outputs.forget_all()
+            self._tell()
+            os.kill(os.getpid(), signal.SIGKILL)
+
+    def _tell(self):
+        with self._telling:
+            if not self._told:
+                self._told = True
+                start = "\r" if sys.stderr.isatty() else ""  # in place of the ^C that a terminal shows
+                with contextlib.suppress(OSError):
+                    os.write(2, f"{start}qx: interrupted\n".encode())
+
+    def _end(self):
+        """Ends the process as the signal does by default, so that a shell's loop ends as well."""
+        if self._told:
+            signal.signal(signal.SIGINT, signal.SIG_DFL)
+            os.kill(os.getpid(), signal.SIGINT)
