@@ -134,6 +134,19 @@ Array2DHandle New2D(std::size_t elementSize, int32_t rows, int32_t cols, const v
     return static_cast<Array2DHandle>(NewArray(2, elementSize, sizes, elements));
 }
 
+// Of the dimension fields and the elements that they count.
+std::size_t UsedBytes(const void *block, int32_t numDims, std::size_t elementSize) {
+    int32_t sizes[2] = {1, 1};
+    std::memcpy(sizes, block, FieldsSize(numDims));
+    const uint64_t count = sizes[0] < 0 || sizes[1] < 0 ? 0
+                                                        : static_cast<uint64_t>(sizes[0]) *
+                                                              static_cast<uint64_t>(sizes[1]);
+    const std::size_t capacity = FrontOf(block).capacity;
+    const std::size_t room = (capacity - FieldsSize(numDims)) / elementSize;
+    return FieldsSize(numDims) +
+           static_cast<std::size_t>(std::min<uint64_t>(count, room)) * elementSize;
+}
+
 } // namespace
 
 int32_t gQXRTVersion = 1;
@@ -183,13 +196,15 @@ int32_t HostBlockReshape(int32_t typeCode, int32_t numDims, void *handleAddress,
     const uint64_t size = FieldsSize(numDims) + wanted * elementSize;
     const std::size_t capacity = FrontOf(*handle).capacity;
     const bool fits = size <= capacity;
-    if (fits && (capacity <= shrinkAbove || size >= capacity / 2))
-        return QXHostDone;
-    void *moved = NewBlock(numDims, wanted, elementSize, false);
-    if (moved == nullptr)
-        return fits ? QXHostDone : QXHostNoMemory;
-    std::memcpy(moved, *handle, fits ? static_cast<std::size_t>(size) : capacity);
-    FreeBlock(*handle);
-    *handle = moved;
-    return QXHostDone;
+    const std::size_t used = std::min<uint64_t>(UsedBytes(*handle, numDims, elementSize), size);
+    void *moved = nullptr;
+    if (!fits || (capacity > shrinkAbove && size < capacity / 2))
+        moved = NewBlock(numDims, wanted, elementSize, true);
+    if (moved != nullptr) {
+        std::memcpy(moved, *handle, used);
+        FreeBlock(*handle);
+        *handle = moved;
+    } else if (fits)
+        std::memset(static_cast<char *>(*handle) + used, 0, static_cast<std::size_t>(size) - used);
+    return moved != nullptr || fits ? QXHostDone : QXHostNoMemory;
 }

@@ -31,7 +31,8 @@ typedef void *PlanSlot;
 typedef void *InstanceWord;
 typedef double (*Function)(double x, void *context);
 
-/** One line, 20000 points.
+/** One line, 20000 points, and in
+    *order another.
     Codes: ErrEmptyInput (f(x, y) is empty, or a), the host's status, ErrOutOfMemory (no memory),
     ErrEmptyInput (counts (those) is empty), WarnLengthsDiffer (a warning). A sentence. */
 QX_API ErrorCode Everything(QX_IN DBL1D x, QX_INOUT CDB2D m, QX_IN Interval1D intervals,
@@ -81,6 +82,7 @@ class Reading(unittest.TestCase):
             ("record", "record", "Interval", "inout"), ("function", "procedure", None, "in"),
             ("kept", "array1d", "DBL", "inout"), ("err", "error", "I32", "out")])
         self.assertEqual([a["name"] for a in everything["arguments"] if a.get("byAddress")], ["kept"])
+        self.assertIn("and in\n*order another.", everything["documentation"])
         self.assertEqual(everything["codes"], ["ErrEmptyInput", "ErrOutOfMemory", "WarnLengthsDiffer"])
         self.assertTrue(everything["hostStatus"] and everything["hasStatus"])
         self.assertFalse(forget["hasStatus"])
@@ -141,6 +143,27 @@ class TakingOver(unittest.TestCase):
             ("Other", [], False, [])])
 
 
+class Values(unittest.TestCase):
+    def test_are_read_from_sentences_and_tables(self):
+        text = """/* All of them. kind: 0 plain; 1 round, or (2; 3) so; 7 as x[1] ... x[n].
+
+   Shapes by shape:
+
+       0  (x[i] - 1) / 2.5      one value      12 wide
+       1  x[i]                  none */
+/** kind: 1; 7. Others are (kind: 5. no). */ QX_API void first(int32_t kind, QX_IN const int32_t *shape);
+/** As first, at a place. place: 2 to 3 both; 5 last. */ QX_API void second(int32_t kind, uint16_t place);
+/** kind: as second. shape: one of many. */ QX_API void third(int32_t kind, double shape);
+/** Of a kind. */ QX_API void fourth(int32_t kind, QX_OUT int32_t *shape);
+"""
+        with tempfile.TemporaryDirectory() as folder:
+            exports = catalogue.read_headers(tree(folder, values=text))["exports"]
+        kinds = [(0, "plain"), (1, "round, or (2; 3) so"), (7, "as x[1] ... x[n]")]
+        self.assertEqual([[a.get("values") for a in e["arguments"]] for e in exports], [
+            [kinds[1:], [(0, "(x[i] - 1) / 2.5"), (1, "x[i]"), (12, "wide")]],
+            [kinds[1:], [(2, "both"), (3, "both"), (5, "last")]], [kinds[1:], None], [kinds, None]])
+
+
 class Refusing(unittest.TestCase):
     BAD = {
         "no documentation": "\nQX_API void f(void);",
@@ -172,6 +195,11 @@ class Refusing(unittest.TestCase):
         "has a status": "\n/** A. */ QX_API void f(QX_OUT ErrorCode *err);",
         "which is no export": "\n/** As g, of x. */ QX_API void f(void);",
         "from itself": "\n/** As g. */ QX_API void f(void);\n/** As f. */ QX_API void g(void);",
+        "is not the next value": "\n/** n: 0 a; 2 b; 1 c. */ QX_API void f(int32_t n);",
+        "not the next value": "\n/** n: 0 a; b. */ QX_API void f(int32_t n);",
+        "'n:' does not end": "\n/** n: 0 a; 1 b */ QX_API void f(int32_t n);",
+        "from g, which is no export": "\n/** n: as g. */ QX_API void f(int32_t n);",
+        "has no values for n": "\n/** n: as f. */ QX_API void f(int32_t n);",
         "must begin": "\n/** A. */ extern QX_API void f(void);",
         "not marked QX_API": "\n/** A. */ void f(void);",
         "does not end": "\n/** A. */ QX_API void f(void)",

@@ -18,6 +18,16 @@ code stands by its name, in the order in which it is raised, with the reason in 
     WarnSingular (a pivot is 0). A sentence that belongs to it no more.
     Codes: none.
 
+Which values an argument takes that chooses among few stands in a sentence that begins with its name
+and a colon, or in an indented table behind such a colon. The values ascend in a sentence, with a
+semicolon between them; a range has one text:
+
+    type: 0 lowpass; 1 highpass, with its cut-off fl; 2 to 5 reserved.
+    form: as IIR_Filter2.
+
+In the introduction of a header it holds for all exports there that have such an argument; a value
+without a text has that of the introduction.
+
 A comment that begins "As NAME, ..." or "As NAME." takes over the text of that export, and its
 codes where it has no such sentence of its own.
 """
@@ -37,6 +47,7 @@ SCALARS = {
     "uint16_t": "U16", "uint32_t": "U32", "U32": "U32", "float": "SGL", "SGL": "SGL", "double": "DBL", "DBL": "DBL",
     "CSG": "CSG", "CDB": "CDB",
 }
+WHOLE = ("I32", "I16", "U8", "U16", "U32")
 DIRECTIONS = {"QX_IN": "in", "QX_OUT": "out", "QX_INOUT": "inout"}
 HANDLE_DIMENSIONS = {"QX_ARRAY_1D": 1, "QX_ARRAY_2D": 2, "QX_ARRAY_3D": 3}
 UNTYPED_HANDLES = {"Array1DHandle", "Array2DHandle", "Array3DHandle"}
@@ -195,7 +206,7 @@ class Types:
 
 def documentation_of(comment):
     lines = re.sub(r"^/\*+", "", comment.text)[:-2].split("\n")
-    lines = [lines[0].strip()] + [re.sub(r"^\s*\* ?", "", line).rstrip() for line in lines[1:]]
+    lines = [lines[0].strip()] + [re.sub(r"^\s*\*(?: |$)", "", line).rstrip() for line in lines[1:]]
     margins = [len(line) - len(line.lstrip()) for line in lines[1:] if line.strip()]
     margin = min(margins, default=0)
     return "\n".join([lines[0]] + [line[margin:] for line in lines[1:]]).strip()
@@ -318,6 +329,87 @@ def raised_by(documentation):
     return items
 
 
+FULL_STOP = re.compile(r"(?<!\.)\.(?= |$)")  # not the dots of "x[1], x[2] ... x[n]"
+VALUE = re.compile(r"(\d+)(?: to (\d+))?(?:\s+(\S.*))?", re.DOTALL)
+
+
+def add_value(values, item, name):
+    """Puts what an item says, "2 bandpass" or "3 to 5", into a dictionary of texts by values."""
+    match = VALUE.fullmatch(item.strip())
+    if not match:
+        raise ValueError(f"'{item.strip()}' under '{name}:' does not begin with a value")
+    first, last, text = int(match[1]), int(match[2] or match[1]), " ".join((match[3] or "").split())
+    if last < first or any(value in values for value in range(first, last + 1)):
+        raise ValueError(f"the values under '{name}:' do not ascend or stand twice, at {match[1]}")
+    values.update(dict.fromkeys(range(first, last + 1), text))
+
+
+def values_in_table(table, name):
+    values = {}
+    for cell in re.split(r" {3,}|\n", table):
+        if re.match(r"\s*\d", cell):
+            add_value(values, cell, name)
+    return values
+
+
+def values_of(documentation, name):
+    """The values that a text tells of an argument, with their texts; the name of the export whose
+    they are; or None."""
+    if match := re.search(rf"\b{name}:\n\n((?: {{3,}}\S.*\n?)+)", documentation):
+        return values_in_table(match[1], name)
+    text = " ".join(documentation.split())
+    match = re.search(rf"(?:^|[.)] ){name}: (as (\w+)\.|(?=\d))", text)
+    if not match:
+        return None
+    if match[2]:
+        return match[2]
+    items, depth = [""], 0
+    for position in range(match.end(), len(text)):
+        character = text[position]
+        depth += (character in "([") - (character in ")]")
+        if depth == 0 and FULL_STOP.match(text, position):
+            break
+        if depth == 0 and character == ";":
+            items.append("")
+        else:
+            items[-1] += character
+    else:
+        raise ValueError(f"the sentence '{name}:' does not end in a full stop")
+    values = {}
+    for item in items:
+        if values and not int((re.match(r"\s*(\d+)", item) or [0, -1])[1]) > max(values):
+            raise ValueError(f"'{item.strip()}' under '{name}:' is not the next value")
+        add_value(values, item, name)
+    return values
+
+
+def find_values(export, by_name, introductions):
+    """Puts "values", pairs of a value and its text, into the arguments of which they are told."""
+    def found(export, name, path=()):
+        if export["name"] in path or all(a["name"] != name for a in export["arguments"]):
+            raise ValueError(f"has no values for {name}: {' from '.join(path) or export['name']}")
+        path = (*path, export["name"])
+        general = values_of(introductions[export["family"]], name)
+        own = values_of(export["documentation"], name)
+        if isinstance(own, str):
+            if own not in by_name:
+                raise ValueError(f"takes the values of {name} from {own}, which is no export")
+            return found(by_name[own], name, path)
+        if own:
+            return {value: text or (general or {}).get(value, "") for value, text in own.items()}
+        like = by_name.get(export["as"] or "")
+        if like and any(a["name"] == name for a in like["arguments"]):
+            return found(like, name, path)
+        return general
+
+    for argument in export["arguments"]:
+        if argument["direction"] != "in" or argument.get("element") not in WHOLE \
+                or argument["kind"] not in ("value", "reference"):
+            continue
+        if values := found(export, argument["name"]):
+            argument["values"] = sorted(values.items())
+
+
 def resolve(export, by_name, path=()):
     """Puts into an export what it takes over from others: "inherited", the names from which it has
     text, nearest first, "codes" and "hostStatus"."""
@@ -438,9 +530,11 @@ def read_headers(include):
             elif "(" in statement.words and statement.words[0] not in ("typedef", "enum"):
                 raise HeaderError(path, statement.line, "a function that is not marked QX_API")
     by_name = {export["name"]: export for export in exports}
+    texts = {family["name"]: family["introduction"] for family in introductions}
     for export in exports:
         try:
             resolve(export, by_name)
+            find_values(export, by_name, texts)
         except ValueError as error:
             raise HeaderError(folder.parent / export["header"], export["line"],
                               f"{export['name']} {error}") from error

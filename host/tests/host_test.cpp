@@ -52,6 +52,26 @@ TEST(Blocks, KeepTheirElementsThroughGrowthAndShrinking) {
     QXHostFree(nullptr);
 }
 
+TEST(Blocks, GrowByZeros) {
+    auto *array = static_cast<Array2DHandle>(QXHostNew2D(QXTypeI32, 0, 0));
+    const auto resized = [&](int32_t rows, int32_t cols) {
+        EXPECT_EQ(HostBlockReshape(QXTypeI32, 2, &array, rows * cols), 0);
+        (*array)->dimSizes[0] = rows;
+        (*array)->dimSizes[1] = cols;
+        auto *elements = static_cast<int32_t *>(QXHostElements2D(array));
+        std::vector<int32_t> found(elements, elements + rows * cols);
+        std::fill(elements, elements + rows * cols, 7);
+        return found;
+    };
+    EXPECT_EQ(resized(200, 100), std::vector<int32_t>(20000, 0)) << "another block";
+    resized(0, 0);
+    EXPECT_EQ(resized(20, 10), std::vector<int32_t>(200, 0)) << "what the block had before";
+    std::vector<int32_t> expected(300, 0);
+    std::fill(expected.begin(), expected.begin() + 200, 7);
+    EXPECT_EQ(resized(30, 10), expected);
+    QXHostFree(array);
+}
+
 #if defined(__linux__) && !defined(__SANITIZE_ADDRESS__) && !defined(__SANITIZE_THREAD__)
 TEST(Blocks, PromiseNoMoreThanTheMachineHas) {
     const auto total = static_cast<uint64_t>(sysconf(_SC_PHYS_PAGES)) *

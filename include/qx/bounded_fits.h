@@ -11,8 +11,8 @@
    are equal is fixed. There must be at least as many samples as free coefficients; without samples
    the bounds of the fixed ones come back.
 
-   method is 0 for least squares, 1 for least absolute residuals and 2 for bisquare, and mse the
-   mean of |w| r^2 over the residuals r, for least absolute residuals the mean of |w r|. tolerance
+   method: 0 least squares; 1 least absolute residuals; 2 bisquare. mse is the mean of |w| r^2 over
+   the residuals r, for least absolute residuals the mean of |w r|. tolerance
    is relative, 0 or below for 0.0001. *iterations is the limit and becomes the number of steps
    done; a step takes time in proportion to the samples, by bisquare twice and more, and with a
    tolerance that they cannot reach the steps go on to the limit. guess holds start values for the

@@ -34,7 +34,7 @@ typedef Array3DBlock **Array3DHandle;
     } * *
 typedef QX_ARRAY_3D(DBL) DBL3D;
 
-/** Definite integral of x by rule 0 to 3; the sign of *dt does not count. Samples left over behind
+/** Definite integral of x. rule: 0 to 3. The sign of *dt does not count. Samples left over behind
     the last whole panel are closed by a rule of lower order at the end of the data, so that the
     result is exact only for the polynomials of that. The code stands in *err, and a failure makes
     the result NaN.
@@ -44,15 +44,15 @@ QX_API int32_t NumerIntegration_head(QX_IN DBL1D x, QX_IN const double *dt,
                                      QX_IN const int32_t *rule, QX_OUT double *result,
                                      QX_OUT ErrorCode *err);
 
-/** As NumerIntegration_head, by rule 0 to 5; samples left over are taken at the start of the data,
+/** As NumerIntegration_head. rule: 0 to 5. Samples left over are taken at the start of the data,
     by a one-sided formula of the rule's own order. The code is the function result.
     Codes: ErrEmptyInput (x is empty), ErrSizesDisagree (x has fewer than rule + 2 samples, or than
    2 for rules 4 and 5), ErrInvalidSelector (the rule is another). */
 QX_API ErrorCode NumerIntegration_2017_head(QX_IN DBL1D x, QX_IN const double *dt,
                                             QX_IN const int32_t *rule, QX_OUT double *result);
 
-/** Definite integral over both dimensions by rule 0 to 3 of NumerIntegration_head: each row with
-   the step dts[0], and the rows' integrals with dts[1]. A failure makes the result NaN. Codes:
+/** Definite integral over both dimensions. rule: as NumerIntegration_head. Each row has
+   the step dts[0], and the rows' integrals have dts[1]. A failure makes the result NaN. Codes:
    ErrSizesDisagree (a dimension is below 3 or shorter than a panel), ErrFewerThanTwo (fewer than
    two steps), ErrInvalidSelector (the rule is another), ErrOutOfMemory (no scratch memory). */
 QX_API ErrorCode NumerIntegration2D_head(QX_IN DBL2D x, QX_IN DBL1D dts, uint16_t rule,
@@ -65,6 +65,7 @@ QX_API ErrorCode NumerIntegration2D_2017_head(QX_IN DBL2D x, QX_IN DBL1D dts, ui
 /** Definite integral over three dimensions d0, d1, d2. The elements are taken as d2 planes, one
     behind the other, of d0 rows of d1 elements, whatever the order in the block: each plane is
     integrated as by NumerIntegration2D_head with dts[0] and dts[1], the planes with dts[2].
+    rule: as NumerIntegration_head.
     Codes: ErrSizesDisagree (a dimension is below 3 or shorter than a panel), ErrFewerThanThree
     (fewer than three steps), ErrInvalidSelector (the rule is another), ErrOutOfMemory (no scratch
     memory). */
@@ -88,7 +89,8 @@ QX_API int32_t Integral(QX_INOUT DBL1D x, QX_IN const double *initial, QX_IN con
         1  (x[i-1] + 4 x[i] + x[i+1]) dt/6                             one initial, one final
         2  (x[i-2] + 3 x[i-1] + 3 x[i] + x[i+1]) dt/8                  two initial, one final
         3  (7 x[i-2] + 32 x[i-1] + 12 x[i] + 32 x[i+1] + 7 x[i+2]) dt/90      two of each
-        4  x[i-1] dt, and 5  x[i] dt, from y[0] = 0                    none
+        4  x[i-1] dt, from y[0] = 0                                    none
+        5  x[i] dt, from y[0] = 0                                      none
 
     Codes: ErrSamplingNotPositive (dt is 0 or below), ErrEmptyInput (x is empty, or one value is
     missing), ErrFewerThanTwo (one of two values is missing), ErrInvalidSelector (the rule is
@@ -96,8 +98,8 @@ QX_API int32_t Integral(QX_INOUT DBL1D x, QX_IN const double *initial, QX_IN con
 QX_API ErrorCode Integral90(QX_INOUT DBL1D x, QX_IN DBL1D initial, QX_IN DBL1D final, double dt,
                             int32_t rule);
 
-/** Running integral from y[0] = 0 without values beyond the data, by rule 0 to 5: the first ones by
-    one-sided formulas, each other by a whole panel from the one a panel before.
+/** Running integral from y[0] = 0 without values beyond the data: the first ones by one-sided
+    formulas, each other by a whole panel from the one a panel before. rule: 0 to 5.
     Codes: ErrSamplingNotPositive (dt is 0 or below), ErrEmptyInput (x is empty), ErrSizesDisagree
    (x has fewer than rule + 2 samples, or than 2 for rules 4 and 5), ErrInvalidSelector (the rule is
     another). */

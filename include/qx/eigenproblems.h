@@ -11,8 +11,8 @@
 
 QX_BEGIN_DECLS
 
-/** Eigenvalues of the square matrix a and, with *output 1, eigenvectors of unit length in the columns
-    of vectors; with *output 0 vectors is empty. Conjugate pairs stand together, the value with
+/** Eigenvalues of the square matrix a and eigenvectors. output: 0 no vectors; 1 vectors of unit length,
+    in columns. Conjugate pairs stand together, the value with
     positive imaginary part first; otherwise the order is that of the iteration. Balancing, reduction
     to Hessenberg form and QR iteration: J. H. Wilkinson and C. Reinsch, "Handbook for Automatic
     Computation", volume II, 1971. The values are those of a matrix that differs from the balanced a by
@@ -26,9 +26,9 @@ QX_API int32_t EigenValueVector_head(QX_IN DBL2D a, QX_IN const int32_t *output,
                                      QX_OUT CDB1D values, QX_OUT CDB2D vectors,
                                      QX_OUT ErrorCode *err);
 
-/** As EigenValueVector_head, for complex elements. *matrixType 0: a general matrix; pairs then mean
-    nothing. 1: a Hermitian one, read from its lower triangle; its values ascend and are real, and its
-    vectors are orthonormal.
+/** As EigenValueVector_head, for complex elements. matrixType: 0 a general matrix, of which
+    pairs mean nothing; 1 a Hermitian one, read from its lower triangle, whose values ascend and are
+    real, and whose vectors are orthonormal.
     Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrOutOfMemory (no memory),
     ErrInvalidSelector (*matrixType or *output is not 0 or 1), ErrNonFiniteInput (an element is not
     finite), ErrIterationLimit (40 iterations were not enough for a value, or 100 if Hermitian). */
@@ -36,8 +36,8 @@ QX_API int32_t CxEigenValueVector_head(QX_IN CDB2D a, QX_IN const int32_t *matri
                                        QX_IN const int32_t *output, QX_OUT CDB1D values,
                                        QX_OUT CDB2D vectors, QX_OUT ErrorCode *err);
 
-/** Eigenvalues, ascending, of the symmetric matrix whose lower triangle a holds. With *output 1 a
-    becomes the matrix of orthonormal eigenvectors, one in each column; with *output 0 it stays.
+/** Eigenvalues, ascending, of the symmetric matrix whose lower triangle a holds. output: 0 a stays; 1
+    a becomes the matrix of orthonormal eigenvectors, one in each column.
     Householder reduction and implicit QL iteration. The error of a value is a few n eps times the
     largest one.
     Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrOutOfMemory (no memory),
@@ -57,8 +57,8 @@ QX_API ErrorCode Schur_head(QX_INOUT DBL2D a, int32_t wantVectors, QX_OUT DBL2D 
 QX_API ErrorCode CxSchur_head(QX_INOUT CDB2D a, int32_t wantVectors, QX_OUT CDB2D u,
                               QX_OUT CDB1D w);
 
-/** As Schur_head, with the eigenvalues in order: 0 as they come; 1 with ascending, 2 with descending
-    real part; 3 with ascending, 4 with descending modulus. A pair of which the imaginary parts are
+/** As Schur_head, with the eigenvalues in order. order: 0 as they come; 1 with ascending real part; 2
+    with descending real part; 3 with ascending modulus; 4 with descending modulus. A pair of which the imaginary parts are
     rounding errors becomes two real values. Eigenvalues too close to be told apart may stay out of
     order.
     Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrInvalidSelector (order is not

@@ -56,7 +56,8 @@ QX_API ErrorCode IIR_Filter_OneState(QX_INOUT DBL1D x, QX_IN DBL1D a, QX_IN DBL1
 QX_API ErrorCode CxSigIIR_Filter_OneState(QX_INOUT CDB1D x, QX_IN DBL1D a, QX_IN DBL1D b,
                                           QX_INOUT CDB1D state, QX_IN const uint8_t *keepState);
 
-/** Filters x in place by a cascade of the given form; without any coefficients x stays as it is.
+/** Filters x in place by a cascade. form: 0 sections of second order; 1 sections of fourth order.
+    Without any coefficients x stays as it is.
     The state is kept from the last call if *keepState is 1 and cleared otherwise. The code is in
     *err; where the host refuses the state, the function result is its status and the state is
     emptied.
@@ -72,8 +73,8 @@ QX_API int32_t CxSigIIR_Filter2(QX_INOUT CDB1D x, QX_IN const int32_t *form, QX_
                                 QX_IN DBL1D b, QX_INOUT CDB1D state, QX_IN const uint8_t *keepState,
                                 QX_OUT ErrorCode *err);
 
-/** Filters one sample in place. mode: 0 a cascade of second-order sections, 1 of fourth-order
-    ones, 2 direct form with its state in one array, 3 the same as an FIR filter, which takes no
+/** Filters one sample in place. mode: 0 a cascade of second-order sections; 1 of fourth-order
+    ones; 2 direct form with its state in one array; 3 the same as an FIR filter, which takes no
     notice of a unless b is empty. The state is cleared if *reset is not 0: the opposite of the
     exports for arrays.
     Codes: ErrInvalidSelector (no such mode), ErrSizesDisagree (a without b; in a cascade also b

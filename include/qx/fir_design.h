@@ -40,8 +40,8 @@ typedef QX_ARRAY_1D(RemezBand) RemezBand1D;
     bands leave much of the axis free, above all in a Hilbert transformer that ends far below fs /
     2, taps may be large and cancel: in one of 100 designs they were (up to 1e20), and the response
     was lost in their rounding although *ripple was small. So look at the largest tap. type: 0 a
-    filter with symmetric taps and bands from 0 to fs / 2; 1 a differentiator and 2 a Hilbert
-    transformer, with antisymmetric taps, h[n - 1 - i] = -h[i]. A differentiator begins at 0, a
+    filter with symmetric taps and bands from 0 to fs / 2; 1 a differentiator; 2 a Hilbert
+    transformer, both with antisymmetric taps, h[n - 1 - i] = -h[i]. A differentiator begins at 0, a
     Hilbert transformer above; both end at fs / 2 with an even n and below it with an odd one.
     maxIterations not above 0 means 100; each takes time as n^2. Where the iterations run out
     *ripple has the last deviation, after any other failure it is NaN. After McClellan, Parks and
@@ -69,8 +69,8 @@ typedef struct NarrowFIRDesign {
 } NarrowFIRDesign;
 
 /** Designs a filter for a narrow band, whose response stays within passRipple (linear) of 1 and
-    below stopAttenuation (dB). type: 0 lowpass and 1 highpass, with the edges fPass and fStop;
-    2 bandpass and 3 bandstop, with the widths fPass and fStop about fCenter. The stretch M is the
+    below stopAttenuation (dB). type: 0 lowpass; 1 highpass, both with the edges fPass and
+    fStop; 2 bandpass; 3 bandstop, both with the widths fPass and fStop about fCenter. The stretch M is the
     one that takes the fewest taps, by an estimate; each stage is then made longer until it has half
     the ripple. A failure empties the arrays and sets M to 0.
     Codes: ErrBadDesignField (no such type, edges out of order, a ripple not above 0, or one so

@@ -14,7 +14,7 @@ QX_BEGIN_DECLS
 /** Generalised Schur form of two square matrices: a = q s z^T and b = q t z^T with orthogonal q and
     z. a becomes s, upper triangular but for blocks of two rows, one for each pair of conjugate
     eigenvalues, and b becomes t, upper triangular. alpha[i] / beta[i] are the eigenvalues as they
-    stand along the diagonals. With wantVectors 0 q and z are empty. order as in Schur80_head.
+    stand along the diagonals. With wantVectors 0 q and z are empty. order: as Schur80_head.
     Codes: ErrEmptyInput (a or b is empty), ErrNotSquare (a is not square), ErrBandVectorSize (b has
     another shape than a), ErrInvalidSelector (order is not 0 to 4), ErrOutOfMemory (no memory),
     ErrNonFiniteInput (an element is not finite), ErrIterationLimit (the iteration did not converge),
@@ -43,8 +43,8 @@ QX_API ErrorCode CxTmiQZ_head(QX_INOUT CDB2D a, QX_INOUT CDB2D b, int32_t order,
                               QX_OUT CDB2D z, QX_OUT CDB1D alpha, QX_OUT CDB1D beta,
                               QX_OUT CDB2D vectors);
 
-/** Generalised eigenvalues of two square matrices, a v = value b v, and with output 1 eigenvectors of
-    unit length in the columns of `vectors`; with output 0 it is empty. An infinite eigenvalue has an
+/** Generalised eigenvalues of two square matrices, a v = value b v, and eigenvectors. output: as
+    EigenValueVector_head. An infinite eigenvalue has an
     infinite real part; one that is not determined, since a and b are singular together, is NaN.
     Codes: ErrEmptyInput (a or b is empty), ErrNotSquare (a is not square), ErrBandVectorSize (b has
     another shape than a), ErrInvalidSelector (output is not 0 or 1), ErrOutOfMemory (no memory),

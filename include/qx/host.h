@@ -59,8 +59,8 @@ static inline void *QXHostElements2D(const void *array) {
 }
 
 /* Called by the exports. Makes room for `count` elements, 0 or a status. The block may move; its
-   old elements are kept as far as they fit, new ones are not set, and the dimension fields are
-   left to the caller. A refusal leaves the array as it is. */
+   old elements, as many as the dimension fields say, are kept as far as they fit, new ones are 0,
+   and the dimension fields are left to the caller. A refusal leaves the array as it is. */
 QX_HOST_API int32_t HostBlockReshape(int32_t typeCode, int32_t numDims, void *handleAddress,
                                      int32_t count);
 

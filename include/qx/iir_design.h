@@ -6,8 +6,8 @@
    each section, H(z) = (b0 + b1 z^-1 + ...) / (1 + a0 z^-1 + ...). The cut-offs are moved
    beforehand, so that the digital filter has them where they were asked for.
 
-   type: 0 lowpass, 1 highpass, both with their cut-off fl (fh is not looked at); 2 bandpass, 3
-   bandstop, between fl and fh. Frequencies are in the unit of the sampling rate fs, ripple (of the
+   type: 0 lowpass; 1 highpass, both with their cut-off fl (fh is not looked at); 2 bandpass; 3
+   bandstop, both between fl and fh. Frequencies are in the unit of the sampling rate fs, ripple (of the
    pass band) and attenuation (of the stop band) in decibels. The order is that of the prototype: a
    band filter has twice as many poles.
 

@@ -38,8 +38,8 @@ QX_API int32_t LinFitCoef80_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, QX
 
 /** The polynomial sum of coefficients[j] x^j, j = 0 to `order`, and its values. In raw powers of x:
     for a high order bring x to the size of 1 beforehand, since powers beyond the range fail and
-    those below it make coefficients infinite. `algorithm` chooses the method as in GenLSFit80_head.
-    At most 26 coefficients are fitted; those of orders above 25 are 0, with a warning.
+    those below it make coefficients infinite. algorithm: as GenLSFit80_head. At most 26 coefficients
+    are fitted; those of orders above 25 are 0, with a warning.
     Codes: ErrSizeMismatch (the arrays differ in length), ErrPolynomialOrderNegative (order is
     negative), ErrPolynomialOrderTooHigh (not more samples than `order`), ErrOutOfMemory (no memory,
     or the host refused a resize), ErrInvalidSelector (no such algorithm), ErrNonFiniteInput (a
@@ -77,8 +77,9 @@ QX_API ErrorCode PolyFit81_head(QX_IN DBL1D x, QX_IN DBL1D y, int32_t order, QX_
                                 QX_OUT DBL1D coefficients, QX_OUT double *mse);
 
 /** The coefficients c that minimise the weighted squares of y - H c, for a matrix with one row per
-    sample, and fit = H c. `algorithm`: 0 singular values; 1, 2, 3 Householder QR; 4 LU and 5
-    Cholesky factorisation of the normal equations, which square the condition of H; 6 singular
+    sample, and fit = H c. algorithm: 0 singular values; 1 to 3 Householder QR; 4 LU
+    factorisation of the normal equations, which square the condition of H; 5 Cholesky factorisation
+    of these; 6 singular
     values without those up to n times 2.2e-16 of the largest. Where columns depend on each other, 6
     gives the shortest of the solutions, and 0 one that rounding errors decide. Where wantCovariance
     is not 0, `covariance` is the inverse of H^T |W| H (not scaled by the MSE), else 0 by 0.

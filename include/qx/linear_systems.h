@@ -142,8 +142,8 @@ QX_API int32_t CholeskyLinEqs_head(QX_IN DBL1D packedFactor, QX_INOUT DBL1D b,
 QX_API int32_t CxCholeskyLinEqs_head(QX_IN CDB1D packedFactor, QX_INOUT CDB1D b,
                                      QX_OUT ErrorCode *err);
 
-/** Solves a x = b for all columns of b with the lower (`triangle` 0) or upper (1) triangle of a;
-    the other one is not read.
+/** Solves a x = b for all columns of b with a triangle of a; the other one is not read. triangle: 0
+    lower; 1 upper.
     Codes: ErrEmptyInput (a or b is empty), ErrNotSquare (a is not square), ErrSizeMismatch (b has
     not as many rows as a), ErrInvalidSelector (triangle is neither 0 nor 1), ErrOutOfMemory (no
     memory, or the host refused the resize), ErrNonFiniteInput (the triangle or b holds NaN or

@@ -10,9 +10,9 @@
 
 QX_BEGIN_DECLS
 
-/** Determinant of a square matrix. *matrixType says how it is known to be: 0 general (LU), 1
-    positive definite (Cholesky, of which the lower triangle is read), 2 lower and 3 upper
-    triangular (the product of the diagonal). One of order 2 is computed by the formula whatever
+/** Determinant of a square matrix. matrixType: 0 general (LU); 1 positive definite (Cholesky, of
+    which the lower triangle is read); 2 lower triangular; 3 upper triangular (the product of the
+    diagonal). One of order 2 is computed by the formula whatever
     the type. It is 0 for a matrix that is singular or, of type 1, not positive definite.
     Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrInvalidSelector
     (*matrixType is not 0 to 3), ErrNonFiniteInput (a holds NaN or infinity), ErrOutOfMemory (no
@@ -33,8 +33,8 @@ QX_API int32_t Rank_head(QX_IN DBL2D a, QX_IN const double *tolerance, QX_OUT in
 QX_API int32_t CxRank_head(QX_IN CDB2D a, QX_IN const double *tolerance, QX_OUT int32_t *rank,
                            QX_OUT ErrorCode *err);
 
-/** Condition number: *normType 0 the quotient of the largest and the smallest singular value, of
-    any matrix; 1, 2, 3 the norm of a square matrix (as in Norm_head) times that of its inverse.
+/** Condition number. normType: 0 the quotient of the largest and the smallest singular value, of
+    any matrix; 1 to 3 the norm of a square matrix (as in Norm_head) times that of its inverse.
     Infinity for a singular matrix, which is no failure.
     Codes: ErrEmptyInput (a is empty), ErrNonFiniteInput (a holds NaN or infinity),
     ErrInvalidSelector (*normType is not 0 to 3), ErrNotSquare (a is not square, of types 1 to 3),
@@ -45,8 +45,8 @@ QX_API int32_t CondNumber_head(QX_IN DBL2D a, QX_IN const int32_t *normType, QX_
 QX_API int32_t CxCondNumber_head(QX_IN CDB2D a, QX_IN const int32_t *normType, QX_OUT DBL *cond,
                                  QX_OUT ErrorCode *err);
 
-/** Norm of a matrix: *normType 0 the largest singular value, 1 the largest column sum of moduli, 2
-    the root of the sum of squares (Frobenius), 3 the largest row sum of moduli.
+/** Norm of a matrix. normType: 0 the largest singular value; 1 the largest column sum of moduli; 2
+    the root of the sum of squares (Frobenius); 3 the largest row sum of moduli.
     Codes: ErrEmptyInput (a is empty), ErrNonFiniteInput (a holds NaN or infinity),
     ErrInvalidSelector (*normType is not 0 to 3), ErrOutOfMemory (no memory), ErrIterationLimit
     (the singular values do not converge). */

@@ -74,7 +74,7 @@ QX_API ErrorCode PeakD2010(QX_INOUT PeakDRequest *request, QX_INOUT PeakDState *
     both are told. The last w samples of a block are scanned with the next one, or with the last-block
     flag.
 
-    mode 0 and 1 scan request->data; mode 2 scans `source`, and request->data plays no part. Modes 1
+    mode: 0 to 1 request->data is scanned; 2 `source` is, and request->data plays no part. Modes 1
     and 2 look for flat blocks: where the block and its history span less than 1e-8, their mean is
     subtracted, in mode 1 in the caller's array, which stays changed, and every window is scaled to
     1 before its parabola is fitted. Overflow is not looked for:

@@ -12,10 +12,10 @@
 
 QX_BEGIN_DECLS
 
-/** Filters a block at one of four rates, with n taps h and upsampled position t of the outputs:
-    mode 0 the same rate, y[t] = gain sum over k of h[k] x[t - k]; mode 1 L times the rate,
-    y[t] = gain L sum over j of h[t mod L + j L] x[t / L - j]; mode 2 every M-th output of mode 0
-    without the gain; mode 3 every M-th output of mode 1. *reset, or an empty state, begins a
+/** Filters a block at one of four rates, with n taps h and upsampled position t of the outputs.
+    mode: 0 the same rate, y[t] = gain sum over k of h[k] x[t - k]; 1 L times the rate,
+    y[t] = gain L sum over j of h[t mod L + j L] x[t / L - j]; 2 every M-th output of mode 0
+    without the gain; 3 every M-th output of mode 1. *reset, or an empty state, begins a
    stream; with *removeDelay its group delay of (n - 1) / 2 samples is taken off, else outputs begin
    with the first input. The size of state is n - 1, ceil(n / L), ceil(n / M) + 1 or ceil(n / L) by
     mode. A change of h or of the rates is noticed by that size alone.

@@ -16,8 +16,9 @@
 
    NaN belongs to no state. Numeric results are 0 after a failure. Times that pass the largest
    number, as with a dt near 1e308, are infinite or NaN, with the code 0, and so is a slew rate by a
-   dt near 0. `limit` is 0 or 1: with 1 the automatic method takes both levels from the histogram or
-   neither, and the regions of aberrations end three times the transition's duration away. */
+   dt near 0. polarity: 0 falling; 1 rising. limit: 0 none; 1 the automatic method takes both levels
+   from the histogram or neither, and the regions of aberrations end three times the transition's
+   duration away from it. */
 
 #include "qx/types.h"
 
@@ -49,7 +50,7 @@ typedef void *MeasurementSlot;
 /* The word that the host keeps for a call node, for the _IDP exports; null at first. */
 typedef void *MeasurementInstanceWord;
 
-/** The levels of the two states and their difference.
+/** The levels of the two states and their difference. method: 0 to 2 those of QXLevelMethod.
     Codes: ErrMeasureNullState (a pointer is null), ErrMeasureEmptyChannel (bins below 1),
     ErrMeasureTooManyChannels (unknown method), ErrOutOfMemory (no memory for the counters),
     ErrMeasureEmpty (y is empty), ErrMeasureLevelsReversed (dt is not above 0), ErrInvalidSelector
@@ -64,7 +65,7 @@ QX_API ErrorCode StateLevels_IDP(QX_IN DBL1D y, double t0, double dt, int32_t me
                                  QX_INOUT MeasurementInstanceWord *instance, QX_OUT double *high,
                                  QX_OUT double *low, QX_OUT double *amplitude, int32_t limit);
 
-/** Pulse number `pulseNumber` (from 1) whose first edge falls (polarity 0) or rises (1): it lies
+/** Pulse number `pulseNumber` (from 1) whose first edge has the polarity: it lies
     between two successive crossings of the mid reference, and a crossing counts once the waveform
     has left the band around mid that reaches to the nearer of the other references. In units of
     time: the duration, the center, and the period between the crossings of number 2 pulseNumber - 1
@@ -105,7 +106,7 @@ QX_API ErrorCode PulseMeas(QX_IN DBL1D y, double t0, double dt, uint16_t polarit
                            QX_OUT double *center, QX_OUT double *lowRef, QX_OUT double *midRef,
                            QX_OUT double *highRef, int32_t limit);
 
-/** Falling (polarity 0) or rising (1) transition number `number` (from 1) between the low and the
+/** Transition number `number` (from 1) of this polarity between the low and the
     high reference: start, end and duration in units of time, and slewRate, the difference of the
     references by the duration. Aberrations are the excursions from the state before and behind the
     transition, up to half the way to the neighbouring transitions or to the ends of the waveform,

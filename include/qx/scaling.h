@@ -52,9 +52,9 @@ QX_API ErrorCode LinEv(QX_INOUT DBL2D x, double a, double b);
     result.
     Codes: ErrSizesDisagree (x is empty). */
 QX_API ErrorCode unWrap(QX_INOUT DBL1D x, QX_OUT ErrorCode *err);
-/** As unWrap, in units of the caller's choice: 0 radians, 1 radians in and degrees out, 2 degrees,
-    3 degrees in and radians out. Angles beyond 5e305 overflow where the unit changes. The code is
-    the function result alone.
+/** As unWrap, in units of the caller's choice. mode: 0 radians; 1 radians in and degrees out; 2
+    degrees; 3 degrees in and radians out. Angles beyond 5e305 overflow where the unit changes. The
+    code is the function result alone.
     Codes: ErrSizesDisagree (x is empty), ErrInvalidSelector (the mode is another). */
 QX_API ErrorCode unWrap85(QX_INOUT DBL1D x, int32_t mode);
 

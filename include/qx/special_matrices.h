@@ -10,7 +10,7 @@
 
 QX_BEGIN_DECLS
 
-/** A matrix of a kind: 0 identity of order *size; 1 diagonal with x; 2 Toeplitz with x as first
+/** A matrix of a kind. kind: 0 identity of order *size; 1 diagonal with x; 2 Toeplitz with x as first
     column and y[1], y[2] ... as the rest of the first row (y[0] is not read); 3 Vandermonde, whose
     row i is the powers of x[i] from the highest to 1; 4 companion of the polynomial with the
     coefficients x, the leading one first: -x[j+1] / x[0] in the first row, ones below the
@@ -51,7 +51,7 @@ QX_API int32_t Compact_to_Matrix_head(QX_IN const PackedTriangle *a, QX_OUT DBL2
 QX_API int32_t CxCompact_to_Matrix_head(QX_IN const CxPackedTriangle *a, QX_OUT CDB2D out,
                                         QX_OUT ErrorCode *err);
 
-/** Packs a triangle of a square matrix: *triangle 0 lower, 1 upper, 2 symmetric, which packs the
+/** Packs a triangle of a square matrix. triangle: 0 lower; 1 upper; 2 symmetric, which packs the
     lower one.
     Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrInvalidSelector
     (*triangle is not 0, 1 or 2), ErrOutOfMemory (the host refused the resize, or the packed length
@@ -94,8 +94,7 @@ QX_API int32_t CreateMatrixFromEVs_head(QX_IN DBL1D values, QX_OUT DBL2D out,
                                         QX_OUT ErrorCode *err);
 
 /** Correlation matrix of order maxLag + 1, out[i][j] = r(i - j): r(k) is the sum over i of x[i +
-    k] conj(y[i]) where both exist, divided by 1 (normalization 0), by the number of its terms (1,
-    unbiased) or by n (2, biased). With y = x it is the autocorrelation matrix, symmetric or
+    k] conj(y[i]) where both exist, normalized. normalization: as Rxy80. With y = x it is the autocorrelation matrix, symmetric or
     Hermitian.
     Codes: ErrEmptyInput (x or y is empty), ErrSizeMismatch (the lengths differ),
     ErrIndexOutOfRange (maxLag is below 0 or not below n), ErrInvalidSelector (normalization is not

@@ -109,8 +109,7 @@ QX_API int32_t RampPtrn(QX_OUT DBL1D x, QX_IN const int32_t *n, QX_IN const doub
 QX_API ErrorCode RampPtrn80(QX_OUT DBL1D x, int32_t n, double start, double end,
                             int32_t excludeEnd);
 
-/** As RampPtrn80, linear for `scale` 0 and in equal ratios for `scale` 1; a negative scale counts
-    as 0.
+/** As RampPtrn80, on a scale. scale: 0 linear; 1 in equal ratios. A negative one counts as 0.
     Codes: ErrCountNotPositive (n is below 1 and the end excluded), ErrFewerThanTwo (the end is
     included, n is below 2, and it is not one sample between equal ends), ErrInvalidSelector (scale
     is above 1), ErrOutOfMemory (the host refused the resize), ErrNotStrictlyPositive (equal ratios

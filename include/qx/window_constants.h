@@ -13,11 +13,11 @@ QX_BEGIN_DECLS
     double.
     Codes: ErrEmptyInput (window is empty). Both constants are then NaN. */
 QX_API ErrorCode NumWinConstH(QX_IN DBL1D window, QX_OUT WindowConstants *constants);
-/** The constants of a named window of n samples: stored values for selectors 0 to 9 and 11,
-    measured ones for 30 to 34 and 60 to 62, over the whole window in 8 n bytes of scratch memory:
-    in time that grows with n, for selector 61 with n log n. The parameter is used as it stands;
-    that of selector 61 is a linear ratio. With code 0 constants are NaN where the window is (a
-    parameter out of its range), and enbw for the triangle of a single sample, which is 0.
+/** The constants of a named window of n samples. selector: as SymmWinH. For selectors up to 11 they
+    are stored values, for the others measured ones, over the whole window in 8 n bytes of scratch
+    memory: in time that grows with n, for selector 61 with n log n. The parameter is used as it
+    stands; that of selector 61 is a linear ratio. With code 0 constants are NaN where the window is
+    (a parameter out of its range), and enbw for the triangle of a single sample, which is 0.
     Codes: ErrEmptyInput (n is below 1), ErrInvalidSelector (another selector), ErrOutOfMemory (no
     scratch memory or no plan). Both constants are then NaN. */
 QX_API ErrorCode WinConstByNameH(int32_t n, int32_t selector, double param,

@@ -8,7 +8,7 @@
    first sample is the window's edge and the mirror of sample i is n - i. In the symmetric form
    the mirror is n - 1 - i.
 
-   Selectors and their parameters:
+   Windows and their parameters by selector:
 
        0 rectangle                       30 triangle
        1 Hanning                         31 Bartlett-Hanning
@@ -133,14 +133,14 @@ QX_API ErrorCode ScaledGenCosWinH(QX_INOUT DBL1D x, QX_IN DBL1D coefs);
 /** As ScaledGenCosWinH, for complex samples. */
 QX_API ErrorCode ScaledCxGenCosWinH(QX_INOUT CDB1D x, QX_IN DBL1D coefs);
 
-/** The cosine sums, selectors 0 to 9 and 11; divided by the coherent gain if `scaled` is non-zero.
+/** The cosine sums; divided by the coherent gain if `scaled` is non-zero. selector: 0 to 9; 11.
     Codes: ErrEmptyInput (x is empty), ErrInvalidSelector (another selector), ErrOutOfMemory (no
     scratch memory). */
 QX_API ErrorCode AllCosWinH(QX_INOUT DBL1D x, int32_t selector, int32_t scaled);
 /** As AllCosWinH, for complex samples. */
 QX_API ErrorCode CxAllCosWinH(QX_INOUT CDB1D x, int32_t selector, int32_t scaled);
 
-/** Any window that has a symmetric form: selectors 0 to 9, 11, 30 to 34, 60 to 62. The parameter is
+/** Any window that has a symmetric form. selector: 0 to 9; 11; 30 to 34; 60 to 62. The parameter is
     used as it stands; that of selector 61 is a linear ratio.
     Codes: ErrEmptyInput (x is empty), ErrInvalidSelector (another selector (unless x has a single
     sample)), ErrOutOfMemory (no scratch memory or no plan). */
@@ -148,7 +148,7 @@ QX_API ErrorCode SymmWinH(QX_INOUT DBL1D x, int32_t selector, double param);
 /** As SymmWinH, for complex samples. */
 QX_API ErrorCode CxSymmWinH(QX_INOUT CDB1D x, int32_t selector, double param);
 
-/** A window divided by its coherent gain: selectors 0 to 9, 11, 30 to 34, 60 to 62. `constants` are
+/** A window divided by its coherent gain. selector: as SymmWinH. `constants` are
     those of the window before the division, NaN after a failure; for cosine sums they are stored
     values, so x may be empty there. The parameter is used as it stands; that of selector 61 is a
     linear ratio.

@@ -21,7 +21,7 @@ QX_API ErrorCode zeroPhaseFiltH(QX_INOUT DBL1D x, QX_IN DBL1D a, QX_IN DBL1D b,
                                 QX_INOUT DBL1D yStateForward, QX_INOUT DBL1D yStateBackward,
                                 int32_t keepState);
 
-/** Filters x in place by a cascade of the given form, as of IIR_Filter2; without any coefficients
+/** Filters x in place by a cascade. form: as IIR_Filter2. Without any coefficients
     x stays as it is. keepState 0 clears the states.
     Codes: ErrEmptyInput (x is empty), ErrSizesDisagree (a without b, or b without a), the host's
     status (it refuses a state), ErrInvalidSelector (no such form), ErrCoefficientSizes (the sizes

@@ -144,7 +144,7 @@ class Kind:
         if isinstance(value, np.ma.MaskedArray) and np.ma.is_masked(value):
             raise ValueError(f"{place}: {np.ma.count_masked(value)} elements are masked, and an array "
                              "of the library has no mask: fill or compress it")
-        array = np.asarray(value, dtype) if dtype.names and not isinstance(value, np.ndarray) \
+        array = self._records(value, place) if dtype.names and not isinstance(value, np.ndarray) \
             else np.asarray(value)
         if array.ndim != self.dimensions:
             raise ValueError(f"{place}: an array of {self.dimensions} dimension"
@@ -162,6 +162,14 @@ class Kind:
             if array.min() < limits.min or array.max() > limits.max:
                 raise ValueError(f"{place}: a value lies outside {limits.min} to {limits.max}")
         return array
+
+    def _records(self, value, place):
+        """A list of tuples as an array of records. NumPy itself would put a number into every field."""
+        names = self.dtype.names
+        for row in value if isinstance(value, (list, tuple)) else [value]:
+            if not isinstance(row, (tuple, list, np.void)) or len(row) != len(names):
+                raise TypeError(f"{place}: a list of tuples ({', '.join(names)}) is needed; {came(row)} came")
+        return np.array([tuple(row) for row in value], self.dtype)
 
     def give_back(self, block):
         """After a call that had the block as an input."""

@@ -17,7 +17,7 @@ from .library import library
 from .outcomes import tell
 from .pointers import GIVES_BACK, address, pointer
 from .records import Record
-from .scalars import C_TYPES, COMPLEX, LIMITS, c_number, real, shown, whole
+from .scalars import C_TYPES, COMPLEX, LIMITS, c_number, chosen, real, shown, whole
 
 RESULTS = {"ErrorCode": "I32", "int32_t": "I32", "uint32_t": "U32", "uint8_t": "U8", "double": "DBL",
            "DBL": "DBL", "float": "SGL"}
@@ -108,7 +108,7 @@ class Writer:
         self.status = "_result" if entry["returns"] == "ErrorCode" else None
         self.types = []  # of the arguments in C
         self.names = {"__name__": "qx", "_byref": ctypes.byref, "_c_void_p": ctypes.c_void_p, "_tell": tell, "_whole": whole,
-                      "_real": real, "_c_number": c_number, "_word": plans.word, "_Record": Record,
+                      "_real": real, "_chosen": chosen, "_c_number": c_number, "_word": plans.word, "_Record": Record,
                       "_address": address, "_pointer": pointer, "_buffer": buffer, "_many": many,
                       "_mapped": mapped, "_procedure": procedure,
                       # An argument may be called as a type is.
@@ -144,7 +144,14 @@ class Writer:
     def _number(self, argument):
         """Holds a real or whole number to its limits; the usual one without a call."""
         name, element, place = python_name(argument), argument["element"], self._place(argument)
-        if element in LIMITS:
+        if values := dict(argument.get("values", ())):
+            held = f"_values_of_{name}"
+            first, last = min(values), max(values)
+            known = f"{first} <= {name} <= {last}" if len(values) == last - first + 1 else f"{name} in {held}"
+            self.names[held] = values
+            self.before += [f"if _type({name}) is not _int or not {known}:",
+                            f"    {name} = _chosen({name}, {held}, {place})"]
+        elif element in LIMITS:
             lowest, highest = LIMITS[element]
             self.before += [f"if _type({name}) is not _int or not {lowest} <= {name} <= {highest}:",
                             f"    {name} = _whole({name}, '{element}', {place})"]
@@ -198,7 +205,7 @@ class Writer:
     _instance = _slot
 
     def _record(self, i, argument):
-        contents = "None" if argument["direction"] == "out" else python_name(argument)
+        contents = "{}" if argument["direction"] == "out" else python_name(argument)
         self.before.append(
             f"_{i} = _Record('{argument['element']}', {contents}, {self._place(argument)})")
         self._pass(f"_byref(_{i}.record)")

@@ -13,7 +13,7 @@ import socket
 import sys
 import threading
 
-from . import outputs
+from .outputs import forget_all
 
 SECONDS = 0.5  # for the process to end by itself
 EXIT = 128 + signal.SIGINT
@@ -45,7 +45,7 @@ class Watch:
             while self._receiver.recv(1)[0] != signal.SIGINT:
                 pass
             threading.Event().wait(SECONDS)
-            outputs.forget_all()
+            forget_all()
             self._tell()
             os.kill(os.getpid(), signal.SIGKILL)
 

@@ -2,6 +2,7 @@
 
 import ctypes
 import functools
+from collections.abc import Mapping
 
 import numpy as np
 
@@ -43,11 +44,9 @@ class Record:
         self.blocks = {}
         self.fields = {field["name"]: field for field in library().records[name]["fields"]
                        if not is_pointer(field)}
-        try:
-            contents = dict({} if contents is None else contents)
-        except (TypeError, ValueError):
+        if not isinstance(contents, Mapping):
             raise TypeError(f"{place}: a dictionary with fields of {name} is needed; "
-                            f"{shown(contents)} came") from None
+                            f"{shown(contents)} came")
         for field in contents:
             if field not in self.fields:
                 raise ValueError(f"{place}: {name} has no field {field!r}; it has "

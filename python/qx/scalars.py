@@ -2,6 +2,7 @@
 
 import ctypes
 import operator
+import textwrap
 
 import numpy as np
 
@@ -33,6 +34,16 @@ def whole(value, element, place):
     lowest, highest = LIMITS[element]
     if not lowest <= number <= highest:
         raise ValueError(f"{place}: {shown(number)} lies outside {lowest} to {highest}")
+    return number
+
+
+def chosen(value, values, place):
+    """An int that is one of the values, a dictionary with a text for each."""
+    number = whole(value, "I32", place)
+    if number not in values:
+        known = "; ".join(f"{value} {textwrap.shorten(text, 60, placeholder=' ...')}".rstrip()
+                          for value, text in values.items())
+        raise ValueError(f"{place}: {shown(number)} is none of its values, which are {known}")
     return number
 
 

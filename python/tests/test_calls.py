@@ -2,6 +2,7 @@
 
 import ast
 import concurrent.futures
+import copy
 import gc
 import inspect
 import multiprocessing
@@ -21,7 +22,7 @@ import numpy as np
 PYTHON = Path(__file__).resolve().parent.parent
 sys.path.insert(0, str(PYTHON))
 import qx  # noqa: E402
-from qx import arrays, plans, stubs  # noqa: E402
+from qx import arrays, functions, plans, stubs  # noqa: E402
 from qx.library import library  # noqa: E402
 
 
@@ -117,8 +118,11 @@ class Arrays(unittest.TestCase):
                 ({"paked": [1.0]}, ValueError, "TriLinEqs_head: a: PackedTriangle has no field 'paked'"),
                 ({"packed": [1j]}, TypeError, r"a\.packed: elements of float64"),
                 ({"triangle": "low"}, TypeError, r"a\.triangle: a whole number is needed; 'low'"),
-                (3, TypeError, "a dictionary with fields of PackedTriangle is needed; 3")):
+                (3, TypeError, "a dictionary with fields of PackedTriangle is needed; 3"),
+                ([], TypeError, "a dictionary with fields of PackedTriangle is needed")):
             self.assertRaisesRegex(error, reason, qx.TriLinEqs_head, given, right)
+        for given in (3.0, [3.0], [(0.0, 1.0)], [(0.0, 1.0, 2), 5], np.array([3.0])):
+            self.assertRaisesRegex(TypeError, "GenHistH: intervals: .* needed", qx.GenHistH, right, given)
 
     def test_what_would_lose_its_meaning_is_refused(self):
         masked = np.ma.array([1.0, 2.0], mask=[False, True])
@@ -333,6 +337,76 @@ class Scalars(unittest.TestCase):
         np.testing.assert_allclose(several[0]**2 + several[1]**2, 1.0, rtol=1e-12)
 
 
+class Selectors(unittest.TestCase):
+    """Arguments that take few values, which the headers tell."""
+
+    REFUSED = {"ErrInvalidSelector", "ErrMeasureTooManyChannels"}
+    NOT_REFUSED = {"Rxy80: algorithm", "RampPtrn85: scale"}  # by the code, which takes them for others
+    GIVEN = {"fs": 8.0, "fl": 1.0, "fh": 2.0, "hist": {"method": 2, "bins": 10}, "iterations": 9,
+             "request": {"width": 3, "data": np.arange(8.0)}, "bins": 10, "tolerance": 1e-3,
+             "pulseNumber": 1, "number": 1, "cycleNumber": 1, "scaled": 0, "symmetric": 0, "n": 8, "attenuation": 40.0,
+             "fixedOrders": [0], "fixedValues": [1.0], "H": np.vander(np.arange(99.0), 2)}
+
+    def given(self, argument):
+        if argument["name"] in self.GIVEN:
+            return self.GIVEN[argument["name"]]
+        if argument["kind"].startswith("array"):
+            n = int(argument["kind"][5])
+            return np.arange(1.0, 100.0) if n == 1 else np.eye(4) if n == 2 else np.ones((8, 8, 8))
+        return {} if argument["kind"] == "record" else 1
+
+    def names_of_codes(self, entry, argument):
+        """What the export says to values of the argument, past the check of the package."""
+        plain, given = copy.deepcopy(entry), {}
+        for other in plain["arguments"]:
+            values = dict(other.pop("values", {}))
+            if functions.is_given(other):
+                given[functions.python_name(other)] = min(values) if values else self.given(other)
+        function = functions.Writer(plain).function()
+        for value in (*range(0 if argument["element"][0] == "U" else -1, 14), 29, 30, 34, 35, 60, 65, 66):
+            given[argument["name"]] = value
+            try:
+                function(**given)
+                yield value, "none"
+            except qx.QxError as error:
+                yield value, error.name
+
+    @mock.patch("warnings.warn")
+    def test_are_those_of_the_code(self, _):
+        checked = 0
+        for entry in library().entries.values():
+            for argument in entry["arguments"]:
+                if "values" not in argument or "ErrInvalidSelector" not in entry["codes"]:
+                    continue
+                place, values = f"{entry['name']}: {argument['name']}", dict(argument["values"])
+                found = dict(self.names_of_codes(entry, argument))
+                self.assertEqual([v for v in values if found.get(v) in self.REFUSED], [], place)
+                if place not in self.NOT_REFUSED:
+                    self.assertEqual({v: found[v] for v in found if v not in values
+                                      and found[v] not in self.REFUSED}, {}, place)
+                checked += 1
+        self.assertGreater(checked, 90)
+
+    def test_others_are_refused_with_the_list(self):
+        x = [1.0, 2.0]
+        for call, reason in (
+                (lambda: qx.Rxy80(x, x, 7, 0), "Rxy80: algorithm: 7 .* 0 direct summation; 1 transforms$"),
+                (lambda: qx.AllCosWinH(x, 12, 0), "1 Hanning; .*; 9 low sidelobe, five terms; 11 Blackman-N"),
+                (lambda: qx.BWCoefs90(9.0, 1.0, 2.0, 2, 4, 0), "type: 4 .*0 lowpass; .*; 3 bandstop"),
+                (lambda: qx.NumerIntegration2D_2017_head(np.eye(9), x, 4), "0; 1; 2; 3$")):
+            self.assertRaisesRegex(ValueError, reason, call)
+        self.assertRaisesRegex(TypeError, "algorithm: a whole number is needed; 0.5", qx.Rxy80, x, x, 0.5, 0)
+        np.testing.assert_allclose(qx.Rxy80(x, x, np.int64(1), 0.0), qx.Rxy80(x, x, 0, 0))
+
+    def test_every_one_that_a_code_refuses_is_told(self):
+        silent = {name for name, entry in library().entries.items() if "ErrInvalidSelector" in entry["codes"]
+                  and not any("values" in argument for argument in entry["arguments"])}
+        # Fields of records and amounts; QZ_head inherits what its order could raise.
+        self.assertEqual(silent, {"QZ_head", "CxQZ_head", "TriLinEqs_head", "CxTriLinEqs_head",
+                                  "Tri_InvMatrix_head", "CxTri_InvMatrix_head", "GammaNoiseH",
+                                  "PoissonNoiseH", "BinomialNoiseH", "PeakD"})
+
+
 class Functions(unittest.TestCase):
     def test_every_export_is_a_function(self):
         stub = {node.name: node for node in ast.parse(stubs.text()).body
@@ -352,6 +426,9 @@ class Functions(unittest.TestCase):
         self.assertLessEqual({"Mean_head", "call", "list"}, set(dir(qx)))
         own = {path.stem for path in (PYTHON / "qx").glob("*.py")} | set(qx.__all__)
         self.assertEqual(own & set(qx.names()), set(), "names that hide an export")
+
+    def test_a_star_that_begins_a_line_is_kept(self):
+        self.assertIn("The code is in\n*err;", qx.IIR_Filter2.__doc__)
 
     def test_the_version_is_the_projects(self):
         project = (PYTHON.parent / "CMakeLists.txt").read_text("utf-8")
