@@ -24,8 +24,12 @@ def parser():
     return parser
 
 
+def arguments(argv):
+    return parser().parse_args(argv)
+
+
 def main(argv=None):
-    options = parser().parse_args(argv)
+    options = arguments(argv)
     for stream in (sys.stdout, sys.stderr):
         stream.reconfigure(errors="replace")
     try:

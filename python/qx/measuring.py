@@ -24,17 +24,17 @@ class Peaks:
     places: np.ndarray
     values: np.ndarray
     curvatures: np.ndarray  # second derivatives, per sample squared
-    prominences: np.ndarray
-    prominence: float  # the least that was asked for
+    prominences: np.ndarray | None = None  # where they were asked for
+    prominence: float = 0.0  # the least that was
 
 
-def prominences(values, places, heights):
-    """The height of each peak above the higher of the lowest values on both sides of it, up to the
-    next higher peak or the end."""
-    if not len(places):
+def prominences(values, maxima):
+    """The height of each local maximum, by its index, above the higher of the lowest values on both
+    sides of it, up to the next higher maximum or the end."""
+    if not len(maxima):
         return np.zeros(0)
-    cuts = np.clip(np.ceil(places).astype(int), 1, len(values) - 1)
-    lowest = np.minimum.reduceat(values, np.r_[0, cuts])  # before the first, between, behind the last
+    heights = values[maxima]
+    lowest = np.minimum.reduceat(values, np.r_[0, maxima])  # before, between and behind them
     left = _lowest_before(heights, lowest[:-1])
     right = _lowest_before(heights[::-1], lowest[:0:-1])[::-1]
     return heights - np.maximum(left, right)
@@ -52,6 +52,16 @@ def _lowest_before(heights, lowest):
     return np.array(found)
 
 
+def local_maxima(values):
+    """The indices of what is higher than both neighbours, of a plateau its middle."""
+    starts = np.flatnonzero(np.diff(values, prepend=np.nan))  # of runs of equal values; not the first
+    starts = np.r_[0, starts[starts > 0]]
+    ends = np.r_[starts[1:], len(values)] - 1
+    level = values[starts]
+    is_higher = np.r_[False, (level[1:-1] > level[:-2]) & (level[1:-1] > level[2:]), False][:len(level)]
+    return (starts[is_higher] + ends[is_higher]) // 2
+
+
 def outstanding(found):
     """The prominence from which on peaks count where nobody says it: two fifths of the third greatest,
     which one or two disturbances do not raise, and at least a fifth of the greatest, since noise is
@@ -60,22 +70,48 @@ def outstanding(found):
     return max(0.4 * greatest[-1], 0.2 * greatest[0]) if len(greatest) else 0.0
 
 
-def peaks(values, threshold=None, width=5, valleys=False, prominence=None):
-    """The peaks, by parabolas over `width` samples, above the threshold and of this prominence at
-    least, or the valleys below it; with neither of both those of outstanding() prominence."""
-    limit = np.finfo(float).max if valleys else -np.finfo(float).max
-    request = {"data": values, "threshold": limit, "width": width, "polarity": int(valleys),
+def vertex(values, at, width):
+    """Place, height and curvature of the parabola through `width` samples around `at`, where it has its
+    vertex among them; else of the sample."""
+    first = min(max(0, at - width // 2), len(values) - width)
+    c0, c1, c2 = call("PolyFit_head", np.arange(width) - (at - first), values[first:first + width], 2, 0)[1]
+    if c2 < 0 and abs(c1) <= -c2 * width:
+        return at - c1 / (2 * c2), c0 - c1**2 / (4 * c2), 2 * c2
+    return float(at), values[at], 2 * c2
+
+
+def prominent_peaks(values, width, prominence=None):
+    """Peaks of the values, smoothed by parabolas over `width` samples, of this prominence at least; of
+    outstanding() prominence where it is None."""
+    smooth = call("SavitzkyGolayFiltH", values, 2, width + (width + 1) % 2, [])
+    maxima = local_maxima(smooth)
+    stand = prominences(smooth, maxima)
+    if prominence is None:
+        prominence = outstanding(stand)
+    rounding = 64 * np.finfo(float).eps * np.abs(values).max()
+    kept = stand >= max(prominence, rounding)
+    places, heights, curvatures = np.array(
+        [vertex(values, at, width) for at in maxima[kept].tolist()]).reshape(-1, 3).T
+    return Peaks(places, heights, curvatures, stand[kept], prominence)
+
+
+def peaks_beyond(values, threshold, width, valleys):
+    request = {"data": values, "threshold": threshold, "width": width, "polarity": int(valleys),
                "flags": WHOLE_STREAM}
     found = call("PeakD", request, {}, [])[0]
+    return Peaks(found["locations"], found["amplitudes"], found["derivatives"])
+
+
+def peaks(values, threshold=None, width=5, valleys=False, prominence=None):
+    """The peaks above the threshold, or the valleys below it, by parabolas over `width` samples. Without
+    a threshold, or with a prominence, those that stand out."""
+    if threshold is not None and prominence is None:
+        return peaks_beyond(values, threshold, width, valleys)
     sign = -1.0 if valleys else 1.0
-    places, heights = found["locations"], found["amplitudes"]
-    stand = prominences(sign * values, places, sign * heights)
-    if prominence is None:
-        prominence = outstanding(stand) if threshold is None else -np.inf
-    kept = stand >= prominence
-    if threshold is not None:
-        kept &= sign * heights > sign * threshold
-    return Peaks(places[kept], heights[kept], found["derivatives"][kept], stand[kept], prominence)
+    found = prominent_peaks(sign * values, width, prominence)
+    kept = slice(None) if threshold is None else found.values > sign * threshold
+    return Peaks(found.places[kept], sign * found.values[kept], sign * found.curvatures[kept],
+                 found.prominences[kept], found.prominence)
 
 
 # Events

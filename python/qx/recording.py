@@ -147,12 +147,10 @@ def _listed(names, most=12):
 
 def _part(start, count, all_of_them):
     """What is told where the memory holds a part of a recording only."""
-    if count == all_of_them:
-        return ""
-    of = f" of {all_of_them}"
-    return (f"; samples {start + 1} to {start + count}{of}, since at most {MOST_SAMPLES} are analysed at "
-            "once (--start takes others)" if all_of_them > MOST_SAMPLES else
-            f"; without the first {start} samples")
+    if all_of_them > MOST_SAMPLES:
+        return (f"; samples {start + 1} to {start + count} of {all_of_them}, since at most {MOST_SAMPLES} "
+                "are analysed at once (--start takes others)")
+    return f"; without the first {start} samples" if start else ""
 
 
 def _of_table(path, column, decimal, missing, start):

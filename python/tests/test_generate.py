@@ -74,6 +74,9 @@ class Generating(unittest.TestCase):
     def test_what_cannot_be_is_one_line(self):
         for arguments, part in ((("sine", self.folder / "out.txt"), ".csv or .wav"),
                                 (("sine", self.folder / "out.wav", "--rate", 2000.5), "whole number"),
+                                (("sine", self.folder / "out.csv", "--frequency", 30000),
+                                 "--frequency 30000 Hz is above half the sampling rate, 22050 Hz"),
+                                (("chirp", self.folder / "out.csv", "--to", 30000), "--to 30000 Hz is above"),
                                 (("impulse", self.folder / "out.csv", "--delay", 9), "ErrIndexOutOfRange"),
                                 (("binomial", self.folder / "out.csv", "--probability", 2),
                                  "ErrInvalidSelector")):

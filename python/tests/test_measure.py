@@ -41,6 +41,39 @@ class Peaks(unittest.TestCase):
         np.testing.assert_allclose(places, 10 * np.pi * (0.5 + 2 * np.arange(16)), atol=2e-3)
         self.assertNotIn("fitMatrix", state)
 
+    def test_prominence_is_the_height_above_the_higher_of_both_sides(self):
+        x = np.array([3, 0, 2, 1, 5, 4, 6, 2, 4, 4, 4, 1, 2.0])
+        maxima = measuring.local_maxima(x)
+        np.testing.assert_array_equal(maxima, [2, 4, 6, 9])
+        # Of 2: to 0 before 3, and to 1 before 5. Of 6, the highest: to 0 and to 1.
+        np.testing.assert_array_equal(measuring.prominences(x, maxima), [1, 1, 5, 2])
+        for x in (np.zeros(9), np.arange(9.0), np.ones(1)):
+            self.assertEqual(measuring.prominences(x, measuring.local_maxima(x)).size, 0)
+
+    def test_what_stands_out_is_found_in_signals_of_many_kinds(self):
+        rng, t = np.random.default_rng(1), np.arange(10_000) / 1000
+        noise, slow = rng.normal(size=10_000), 2 * np.pi * 5 * t
+
+        def bells(places, width, heights=1.0):
+            return np.sum(np.broadcast_to(heights, len(places))[:, None]
+                          * np.exp(-((t - np.array(places)[:, None]) / width)**2), axis=0)
+
+        often = np.arange(0.5, 10, 0.8)
+        for name, x, expected in (
+                ("sine", np.sin(slow), 50), ("fast sine", np.sin(1.0 * np.arange(1000)), 159),
+                ("in noise", np.sin(slow) + 0.1 * noise, 50), ("in more", np.sin(slow) + 0.2 * noise, 50),
+                ("in steps", np.round(10 * np.sin(slow)), 50), ("chirp", np.sin(2 * np.pi * (t + t**2)), 110),
+                ("square", np.sign(np.sin(2 * np.pi * 2 * t)) + 0.01 * noise, 20),
+                ("few", bells([1, 3, 4.5, 7, 9], 0.02) + 0.02 * noise, 5),
+                ("one", bells([3], 0.02) + 0.02 * noise, 1),
+                ("on a drift", bells(often, 0.012) + 2 * np.sin(0.5 * t) + 0.03 * noise, 12),
+                ("one disturbed", bells(often, 0.012, [3.5] + 11 * [1.0]) + 0.03 * noise, 12)):
+            with self.subTest(name):
+                self.assertEqual(len(measuring.peaks(x).places), expected)
+                self.assertEqual(len(measuring.peaks(-x, valleys=True).places), expected)
+        found = measuring.peaks(np.sin(slow) + 2.0 * (t > 5), prominence=1.0, threshold=2.0)
+        self.assertEqual(len(found.places), 25)
+
     def test_threshold_and_polarity(self):
         x = np.tile([0, 0, 0, 0, 0, 0, 1, 3, 1, 0, 0, 0, 0, -2, 0], 20)
         for valleys in (False, True):
@@ -114,6 +147,8 @@ class Commands(unittest.TestCase):
         self.assertIn("58 events", ran.stdout)
         head, rows = self.written()
         self.assertEqual((head, rows.shape), (["time (s)", "mV"], (58, 2)))
+        # The 58 beats, and a burst of noise as high as they are.
+        self.assertIn(": 59 peaks that stand out by", self.run_command("peaks", RECORDING).stdout)
         ran = self.run_command("peaks", RECORDING, "--threshold", "1.2", "--width", "9", "--csv", self.table,
                                "--force")
         head, rows = self.written()

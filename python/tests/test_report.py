@@ -157,6 +157,8 @@ class Reading(InFolder):
         text = "t,u\n0,1\n1,\n2,NA\n3,4\n"
         self.holds(text, [1, 2, 3, 4], 1, "2 missing values interpolated", missing="interpolate")
         self.holds(text, [1, 4], 1 / 3, "2 missing values left out", missing="skip")
+        for missing in ("interpolate", "skip"):
+            self.assertNotIn("first", self.read(text, missing=missing).choice)
         with self.assertRaisesRegex(recording.InputError, ":3: column 2, u: '' where a value is needed"):
             self.read(text)
         self.assertRaisesRegex(recording.InputError, "no value is left", self.read, "u\n1\n-\n",

@@ -1,6 +1,7 @@
 """The command resample: WAV files at another rate."""
 
 import os
+import re
 import subprocess
 import sys
 import tempfile
@@ -106,6 +107,39 @@ class Resample(unittest.TestCase):
         with self.assertRaisesRegex(ValueError, "no field 'hist'"):
             qx.call("Resample_Const", x, {"hist": x}, design, 1, 1)
 
+    def test_the_ending_says_the_format(self):
+        sound = 0.1 * tone(100, 8000, 500)
+        for subtype, ending, kind, expected in (
+                ("PCM_16", "flac", "FLAC", "PCM_16"), ("FLOAT", "flac", "FLAC", "PCM_24"),
+                ("PCM_24", "FLAC", "FLAC", "PCM_24"), ("FLOAT", "wav", "WAV", "FLOAT"),
+                ("PCM_16", "aiff", "AIFF", "PCM_16"), ("DOUBLE", "w64", "W64", "DOUBLE")):
+            with self.subTest(subtype=subtype, ending=ending):
+                soundfile.write(self.source, sound, 8000, subtype)
+                target = f"{self.target[:-3]}{subtype}.{ending}"
+                ran = self.command(self.source, target, "--rate", "16000")
+                self.assertEqual(ran.stderr, "")
+                found = soundfile.info(target)
+                self.assertEqual((found.format, found.subtype, found.samplerate), (kind, expected, 16000))
+                self.assertEqual(f", {expected} in place of {subtype}\n" in ran.stdout, subtype != expected)
+                self.assertLess(decibel(soundfile.read(target)[0][::2][20:-20] - sound[20:-20]), -60)
+
+    def test_clipping_is_told(self):
+        square = np.sign(np.sin(2 * np.pi * 0.01 * (np.arange(2000) + 0.5)))
+        for subtype, clipped in (("PCM_16", True), ("FLOAT", False)):
+            soundfile.write(self.source, square, 8000, subtype)
+            ran = self.command(self.source, self.target, "--rate", "44100", "--force")
+            sound, _ = soundfile.read(self.target)
+            self.assertEqual((ran.returncode, np.abs(sound).max() > 1), (0, not clipped))
+            if not clipped:  # as many as there would be beyond full scale
+                self.assertEqual(ran.stderr, "")
+                beyond = np.abs(sound)
+                self.assertAlmostEqual(told[0], np.count_nonzero(beyond > 1), delta=20)
+                self.assertAlmostEqual(told[1], decibel(sound), delta=0.02)
+                continue
+            match = re.fullmatch(r"qx: .*out.wav: (\d+) samples beyond full scale, by up to (\S+) dB, "
+                                 r"clipped\n", ran.stderr)
+            told = int(match[1]), float(match[2])
+
     def test_every_failure_is_one_line_and_leaves_no_file(self):
         soundfile.write(self.source, tone(100, 8000, 50), 8000)
         for source, target, rate, reason in (
@@ -113,6 +147,7 @@ class Resample(unittest.TestCase):
                 (__file__, self.target, "8000", "cannot be read as audio"),
                 (self.source, "/nowhere/out.wav", "44100", "cannot be written"),
                 (self.source, self.target, "7999993", "common divisor"),
+                (self.source, self.target[:-3] + "mp3", "44100", "must end in one of .wav, "),
                 (self.source, self.target, "0", "not between")):
             with self.subTest(reason=reason):
                 ran = self.command(source, target, "--rate", rate)

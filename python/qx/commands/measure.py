@@ -84,8 +84,10 @@ def peaks(options):
         found = measuring.peaks(read.values, options.threshold, options.width, options.valleys,
                                 options.prominence)
         places = found.places
-        rows = list(zip(places * step, found.values, found.curvatures / step**2, found.prominences))
-        names = [time, value, "second derivative", f"prominence ({read.unit})" if read.unit else "prominence"]
+        columns = {time: places * step, value: found.values, "second derivative": found.curvatures / step**2}
+        if found.prominences is not None:
+            columns[f"prominence ({read.unit})" if read.unit else "prominence"] = found.prominences
+        names, rows = list(columns), list(zip(*columns.values()))
         said = []
         if options.threshold is not None:
             side = "below" if options.valleys else "above"
