@@ -138,9 +138,9 @@ Array2DHandle New2D(std::size_t elementSize, int32_t rows, int32_t cols, const v
 std::size_t UsedBytes(const void *block, int32_t numDims, std::size_t elementSize) {
     int32_t sizes[2] = {1, 1};
     std::memcpy(sizes, block, FieldsSize(numDims));
-    const uint64_t count = sizes[0] < 0 || sizes[1] < 0 ? 0
-                                                        : static_cast<uint64_t>(sizes[0]) *
-                                                              static_cast<uint64_t>(sizes[1]);
+    const uint64_t count = sizes[0] < 0 || sizes[1] < 0
+                               ? 0
+                               : static_cast<uint64_t>(sizes[0]) * static_cast<uint64_t>(sizes[1]);
     const std::size_t capacity = FrontOf(block).capacity;
     const std::size_t room = (capacity - FieldsSize(numDims)) / elementSize;
     return FieldsSize(numDims) +

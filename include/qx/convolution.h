@@ -3,9 +3,9 @@
 
 /* Linear convolution, correlation and deconvolution of sequences and of matrices.
 
-   The caller chooses; no size switches the algorithm. algorithm: 0 direct summation; 1 transforms. The
-   direct form is exact to the rounding of each sum and keeps infinities and NaN where they belong;
-   transforms cost n log n and leave an error relative to the greatest value.
+   The caller chooses; no size switches the algorithm. algorithm: 0 direct summation; 1 transforms.
+   The direct form is exact to the rounding of each sum and keeps infinities and NaN where they
+   belong; transforms cost n log n and leave an error relative to the greatest value.
 
    Correlations are normalized. normalization: 0 none; 1 unbiased (each lag divided by the number of
    its terms); 2 biased (all divided by the greater length). */

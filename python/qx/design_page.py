@@ -28,7 +28,8 @@ def page(title, section):
                    for row in section.rows)
     figures = "".join(f"<figure>{figure}</figure>" for figure in section.figures)
     return (f'<!DOCTYPE html>\n<html lang="en"><head><meta charset="utf-8">'
-            f'<meta name="viewport" content="width=device-width">{outputs.generator("design")}<title>{html.escape(title)}</title>'
+            f'<meta name="viewport" content="width=device-width">{outputs.generator("design")}'
+            f"<title>{html.escape(title)}</title>"
             f"<style>{report.COMMON_STYLE} td {{ padding: .1em 1.2em .1em 0; }}</style></head><body>"
             f"<h1>{html.escape(title)}</h1>{figures}<table>{rows}</table></body></html>\n")
 

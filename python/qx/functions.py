@@ -108,7 +108,8 @@ class Writer:
         self.status = "_result" if entry["returns"] == "ErrorCode" else None
         self.types = []  # of the arguments in C
         self.names = {"__name__": "qx", "_byref": ctypes.byref, "_c_void_p": ctypes.c_void_p, "_tell": tell, "_whole": whole,
-                      "_real": real, "_chosen": chosen, "_c_number": c_number, "_word": plans.word, "_Record": Record,
+                      "_real": real, "_chosen": chosen, "_c_number": c_number, "_word": plans.word,
+                      "_Record": Record,
                       "_address": address, "_pointer": pointer, "_buffer": buffer, "_many": many,
                       "_mapped": mapped, "_procedure": procedure,
                       # An argument may be called as a type is.

@@ -154,7 +154,8 @@ def index(found):
         for outcome in found if not outcome.failure)
     failed = "".join(f"<li>{escape(outcome.failure)}</li>\n" for outcome in found if outcome.failure)
     read = sum(not outcome.failure for outcome in found)
-    return (f'<!DOCTYPE html>\n<html lang="en"><head>{HEAD}{outputs.generator("report")}<title>Recordings</title><style>{STYLE}'
+    return (f'<!DOCTYPE html>\n<html lang="en"><head>{HEAD}{outputs.generator("report")}'
+            f"<title>Recordings</title><style>{STYLE}"
             "div.wide { overflow-x: auto; }</style></head><body><h1>Recordings</h1>"
             f"<p>{read} of {len(found)} recordings were read.</p>"
             f'<div class="wide"><table><tr>{header}</tr>\n{rows}</table></div>'

@@ -344,7 +344,8 @@ class Selectors(unittest.TestCase):
     NOT_REFUSED = {"Rxy80: algorithm", "RampPtrn85: scale"}  # by the code, which takes them for others
     GIVEN = {"fs": 8.0, "fl": 1.0, "fh": 2.0, "hist": {"method": 2, "bins": 10}, "iterations": 9,
              "request": {"width": 3, "data": np.arange(8.0)}, "bins": 10, "tolerance": 1e-3,
-             "pulseNumber": 1, "number": 1, "cycleNumber": 1, "scaled": 0, "symmetric": 0, "n": 8, "attenuation": 40.0,
+             "pulseNumber": 1, "number": 1, "cycleNumber": 1, "scaled": 0, "symmetric": 0, "n": 8,
+             "attenuation": 40.0,
              "fixedOrders": [0], "fixedValues": [1.0], "H": np.vander(np.arange(99.0), 2)}
 
     def given(self, argument):

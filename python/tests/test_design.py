@@ -90,7 +90,8 @@ class Command(unittest.TestCase):
 
     def test_says_in_one_line_what_cannot_be(self):
         with tempfile.TemporaryDirectory() as folder:
-            for arguments, said in ((("bessel", "lowpass", "50", "--rate", "100"), "not below half the sampling rate"),
+            for arguments, said in ((("bessel", "lowpass", "50", "--rate", "100"),
+                                     "not below half the sampling rate"),
                                     (("elliptic", "bandpass", "5", "80", "--rate", "100"),
                                      "the edge 80 Hz is above half the sampling rate, 50 Hz"),
                                     (("elliptic", "bandstop", "52", "48", "--rate", "1000"),
