@@ -11,15 +11,14 @@
 
 QX_BEGIN_DECLS
 
-/** Eigenvalues of the square matrix a and eigenvectors. output: 0 no vectors; 1 vectors of unit length,
-    in columns. Conjugate pairs stand together, the value with
-    positive imaginary part first; otherwise the order is that of the iteration. Balancing, reduction
-    to Hessenberg form and QR iteration: J. H. Wilkinson and C. Reinsch, "Handbook for Automatic
-    Computation", volume II, 1971. The values are those of a matrix that differs from the balanced a by
-    a few n eps of its norm. Matrices that are graded over the whole range of the numbers can pass the
-    limit of the iteration: random elements that halve from row to row and from column to column do
-    from order 110 on.
-    Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrOutOfMemory (no memory),
+/** Eigenvalues of the square matrix a and eigenvectors. output: 0 no vectors; 1 vectors of unit
+   length, in columns. Conjugate pairs stand together, the value with positive imaginary part first;
+   otherwise the order is that of the iteration. Balancing, reduction to Hessenberg form and QR
+   iteration: J. H. Wilkinson and C. Reinsch, "Handbook for Automatic Computation", volume II, 1971.
+   The values are those of a matrix that differs from the balanced a by a few n eps of its norm.
+   Matrices that are graded over the whole range of the numbers can pass the limit of the iteration:
+   random elements that halve from row to row and from column to column do from order 110 on. Codes:
+   ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrOutOfMemory (no memory),
     ErrInvalidSelector (*output is not 0 or 1), ErrNonFiniteInput (an element is not finite),
     ErrIterationLimit (40 iterations were not enough for a value). */
 QX_API int32_t EigenValueVector_head(QX_IN DBL2D a, QX_IN const int32_t *output,
@@ -36,11 +35,10 @@ QX_API int32_t CxEigenValueVector_head(QX_IN CDB2D a, QX_IN const int32_t *matri
                                        QX_IN const int32_t *output, QX_OUT CDB1D values,
                                        QX_OUT CDB2D vectors, QX_OUT ErrorCode *err);
 
-/** Eigenvalues, ascending, of the symmetric matrix whose lower triangle a holds. output: 0 a stays; 1
-    a becomes the matrix of orthonormal eigenvectors, one in each column.
-    Householder reduction and implicit QL iteration. The error of a value is a few n eps times the
-    largest one.
-    Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrOutOfMemory (no memory),
+/** Eigenvalues, ascending, of the symmetric matrix whose lower triangle a holds. output: 0 a stays;
+   1 a becomes the matrix of orthonormal eigenvectors, one in each column. Householder reduction and
+   implicit QL iteration. The error of a value is a few n eps times the largest one. Codes:
+   ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrOutOfMemory (no memory),
     ErrInvalidSelector (*output is not 0 or 1), ErrNonFiniteInput (an element is not finite),
     ErrIterationLimit (100 iterations were not enough for a value). */
 QX_API int32_t SymEvectorEvalue_head(QX_INOUT DBL2D a, QX_IN const int32_t *output,
@@ -57,13 +55,12 @@ QX_API ErrorCode Schur_head(QX_INOUT DBL2D a, int32_t wantVectors, QX_OUT DBL2D 
 QX_API ErrorCode CxSchur_head(QX_INOUT CDB2D a, int32_t wantVectors, QX_OUT CDB2D u,
                               QX_OUT CDB1D w);
 
-/** As Schur_head, with the eigenvalues in order. order: 0 as they come; 1 with ascending real part; 2
-    with descending real part; 3 with ascending modulus; 4 with descending modulus. A pair of which the imaginary parts are
-    rounding errors becomes two real values. Eigenvalues too close to be told apart may stay out of
-    order.
-    Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrInvalidSelector (order is not
-    0 to 4), ErrOutOfMemory (no memory), ErrNonFiniteInput (an element is not finite),
-    ErrIterationLimit (the iteration did not converge). */
+/** As Schur_head, with the eigenvalues in order. order: 0 as they come; 1 with ascending real part;
+   2 with descending real part; 3 with ascending modulus; 4 with descending modulus. A pair of which
+   the imaginary parts are rounding errors becomes two real values. Eigenvalues too close to be told
+   apart may stay out of order. Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square),
+   ErrInvalidSelector (order is not 0 to 4), ErrOutOfMemory (no memory), ErrNonFiniteInput (an
+   element is not finite), ErrIterationLimit (the iteration did not converge). */
 QX_API ErrorCode Schur80_head(QX_INOUT DBL2D a, int32_t wantVectors, int32_t order, QX_OUT DBL2D u,
                               QX_OUT CDB1D w);
 /** As Schur80_head, for complex elements: a = u t u^H with a triangular t. */

@@ -17,9 +17,9 @@ QX_BEGIN_DECLS
     stand along the diagonals. With wantVectors 0 q and z are empty. order: as Schur80_head.
     Codes: ErrEmptyInput (a or b is empty), ErrNotSquare (a is not square), ErrBandVectorSize (b has
     another shape than a), ErrInvalidSelector (order is not 0 to 4), ErrOutOfMemory (no memory),
-    ErrNonFiniteInput (an element is not finite), ErrIterationLimit (the iteration did not converge),
-    ErrConditionTooHigh (it failed for another reason), ErrSolverCount (rounding changed the
-    eigenvalues). */
+    ErrNonFiniteInput (an element is not finite), ErrIterationLimit (the iteration did not
+   converge), ErrConditionTooHigh (it failed for another reason), ErrSolverCount (rounding changed
+   the eigenvalues). */
 QX_API ErrorCode QZ80_head(QX_INOUT DBL2D a, QX_INOUT DBL2D b, int32_t wantVectors, int32_t order,
                            QX_OUT DBL2D q, QX_OUT DBL2D z, QX_OUT CDB1D alpha, QX_OUT DBL1D beta);
 /** As QZ80_head, for complex elements: a = q s z^H and b = q t z^H with triangular s and t. */
@@ -48,9 +48,9 @@ QX_API ErrorCode CxTmiQZ_head(QX_INOUT CDB2D a, QX_INOUT CDB2D b, int32_t order,
     infinite real part; one that is not determined, since a and b are singular together, is NaN.
     Codes: ErrEmptyInput (a or b is empty), ErrNotSquare (a is not square), ErrBandVectorSize (b has
     another shape than a), ErrInvalidSelector (output is not 0 or 1), ErrOutOfMemory (no memory),
-    ErrNonFiniteInput (an element is not finite), ErrIterationLimit (the iteration did not converge),
-    ErrConditionTooHigh (it failed for another reason), ErrSolverCount (rounding changed the
-    eigenvalues). */
+    ErrNonFiniteInput (an element is not finite), ErrIterationLimit (the iteration did not
+   converge), ErrConditionTooHigh (it failed for another reason), ErrSolverCount (rounding changed
+   the eigenvalues). */
 QX_API ErrorCode GenEigenEx_head(QX_IN DBL2D a, QX_IN DBL2D b, int32_t output,
                                  QX_OUT CDB1D values, QX_OUT CDB2D vectors);
 /** As GenEigenEx_head, for complex elements. */

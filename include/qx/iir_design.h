@@ -7,9 +7,9 @@
    beforehand, so that the digital filter has them where they were asked for.
 
    type: 0 lowpass; 1 highpass, both with their cut-off fl (fh is not looked at); 2 bandpass; 3
-   bandstop, both between fl and fh. Frequencies are in the unit of the sampling rate fs, ripple (of the
-   pass band) and attenuation (of the stop band) in decibels. The order is that of the prototype: a
-   band filter has twice as many poles.
+   bandstop, both between fl and fh. Frequencies are in the unit of the sampling rate fs, ripple (of
+   the pass band) and attenuation (of the stop band) in decibels. The order is that of the
+   prototype: a band filter has twice as many poles.
 
    form: 0 second-order sections, with 2 values in a and 3 in b each; 1 fourth-order sections, with
    4 and 5. The exports without a form give 0 to lowpass and highpass and 1 to the others. A real

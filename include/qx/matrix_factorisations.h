@@ -82,11 +82,11 @@ QX_API int32_t Tri_InvMatrix_head(QX_INOUT PackedTriangle *a, QX_OUT ErrorCode *
 /** As Tri_InvMatrix_head, for complex elements. */
 QX_API int32_t CxTri_InvMatrix_head(QX_INOUT CxPackedTriangle *a, QX_OUT ErrorCode *err);
 
-/** The inverse of a triangular matrix, in its place. triangle: 0 lower; 1 upper. The other triangle is not read; it becomes 0.
-    Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrInvalidSelector (*triangle
-    is not 0 or 1), ErrOutOfMemory (no memory), ErrNonFiniteInput (an element is not finite),
-    ErrSingularMatrix (a diagonal element is at most 2.2e-16 of the largest element in absolute
-    value). */
+/** The inverse of a triangular matrix, in its place. triangle: 0 lower; 1 upper. The other triangle
+   is not read; it becomes 0. Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square),
+   ErrInvalidSelector (*triangle is not 0 or 1), ErrOutOfMemory (no memory), ErrNonFiniteInput (an
+   element is not finite), ErrSingularMatrix (a diagonal element is at most 2.2e-16 of the largest
+   element in absolute value). */
 QX_API int32_t InvMatrixTriDri_head(QX_INOUT DBL2D a, QX_IN const int32_t *triangle,
                                     QX_OUT ErrorCode *err);
 /** As InvMatrixTriDri_head, for complex elements. */
@@ -95,25 +95,24 @@ QX_API int32_t CxInvMatrixTriDri_head(QX_INOUT CDB2D a, QX_IN const int32_t *tri
 
 /** a = q r with q of m by m unitary and r of m by n upper triangular, for a of m by n. algorithm: 0
     Householder reflections; 1 modified Gram-Schmidt orthogonalisation; 2 the classical one. By
-    reflections the diagonal of r has either sign. Orthogonalisation makes each projection twice; the
-    diagonal of r is then not
-    negative, and 0 for a column that depends on those before it within m eps, where q goes on with
-    another vector orthogonal to them. All three leave q unitary and a - q r small to a few m eps,
-    however ill-conditioned a is. L. Giraud, J. Langou, M. Rozloznik, "On the loss of orthogonality in
-    the Gram-Schmidt orthogonalization process", 2005.
-    Codes: ErrEmptyInput (a is empty), ErrInvalidSelector (*algorithm is not 0, 1 or 2),
-    ErrOutOfMemory (no memory), ErrNonFiniteInput (an element is not finite). */
+    reflections the diagonal of r has either sign. Orthogonalisation makes each projection twice;
+   the diagonal of r is then not negative, and 0 for a column that depends on those before it within
+   m eps, where q goes on with another vector orthogonal to them. All three leave q unitary and a -
+   q r small to a few m eps, however ill-conditioned a is. L. Giraud, J. Langou, M. Rozloznik, "On
+   the loss of orthogonality in the Gram-Schmidt orthogonalization process", 2005. Codes:
+   ErrEmptyInput (a is empty), ErrInvalidSelector (*algorithm is not 0, 1 or 2), ErrOutOfMemory (no
+   memory), ErrNonFiniteInput (an element is not finite). */
 QX_API int32_t qrd_head(QX_IN DBL2D a, QX_IN const int32_t *algorithm, QX_OUT DBL2D q,
                         QX_OUT DBL2D r, QX_OUT ErrorCode *err);
 /** As qrd_head, for complex elements; the diagonal of r is real. */
 QX_API int32_t Cxqrd_head(QX_IN CDB2D a, QX_IN const int32_t *algorithm, QX_OUT CDB2D q,
                           QX_OUT CDB2D r, QX_OUT ErrorCode *err);
 
-/** QR factors by Householder reflections of the m by n matrix a, k = min(m, n). economy: 0 q of m by
-    m and r of m by n; 1 q of m by k and r of k by n; 2 r of k by n only, and q is empty. With
-    pivoting 0 a = q r, and permutation is empty. Otherwise a permutation = q r, where permutation is
-    n by n with a single 1 in each row and column, and each step takes the longest remaining column, so
-    that the diagonal of r falls in absolute value (P. Businger and G. H. Golub, 1965).
+/** QR factors by Householder reflections of the m by n matrix a, k = min(m, n). economy: 0 q of m
+   by m and r of m by n; 1 q of m by k and r of k by n; 2 r of k by n only, and q is empty. With
+    pivoting 0 a = q r, and permutation is empty. Otherwise a permutation = q r, where permutation
+   is n by n with a single 1 in each row and column, and each step takes the longest remaining
+   column, so that the diagonal of r falls in absolute value (P. Businger and G. H. Golub, 1965).
     Codes: ErrEmptyInput (a is empty), ErrInvalidSelector (economy is not 0, 1 or 2), ErrOutOfMemory
     (no memory), ErrNonFiniteInput (an element is not finite). */
 QX_API ErrorCode QRDecH(QX_IN DBL2D a, int32_t pivoting, int32_t economy, QX_OUT I32_2D permutation,
@@ -155,28 +154,28 @@ QX_API ErrorCode Hessenberg_head(QX_INOUT DBL2D a, int32_t low, int32_t high, QX
 /** As Hessenberg_head, for complex elements: h = q^H a q. */
 QX_API ErrorCode CxHessenberg_head(QX_INOUT CDB2D a, int32_t low, int32_t high, QX_OUT CDB2D q);
 
-/** Balances the square matrix a in its place. job: 0 does nothing; 1 permutes rows and columns so that
-    eigenvalues are isolated in the corners; 2 multiplies rows and columns by powers of two so that
-    their sums of absolute values become alike, but none whose sums or factor lie outside 2^-970 to
-    2^970; 3 does both. Rows and columns *low to *high, counted from 1, are the block between the
-    corners. scale[i] is the factor of row and column i of the block; outside it is the number, from 1,
-    of the row with which row i was exchanged, the last ones first, from n down to high + 1, then those
-    from 1 to low - 1. B. N. Parlett and C. Reinsch, "Balancing a matrix for calculation of eigenvalues
-    and eigenvectors", 1969.
-    Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrInvalidSelector (job is not 0
-    to 3), ErrOutOfMemory (no memory), ErrNonFiniteInput (an element is not finite). */
+/** Balances the square matrix a in its place. job: 0 does nothing; 1 permutes rows and columns so
+   that eigenvalues are isolated in the corners; 2 multiplies rows and columns by powers of two so
+   that their sums of absolute values become alike, but none whose sums or factor lie outside 2^-970
+   to 2^970; 3 does both. Rows and columns *low to *high, counted from 1, are the block between the
+    corners. scale[i] is the factor of row and column i of the block; outside it is the number, from
+   1, of the row with which row i was exchanged, the last ones first, from n down to high + 1, then
+   those from 1 to low - 1. B. N. Parlett and C. Reinsch, "Balancing a matrix for calculation of
+   eigenvalues and eigenvectors", 1969. Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not
+   square), ErrInvalidSelector (job is not 0 to 3), ErrOutOfMemory (no memory), ErrNonFiniteInput
+   (an element is not finite). */
 QX_API ErrorCode MatrixBalance_head(QX_INOUT DBL2D a, int32_t job, QX_OUT int32_t *low,
                                     QX_OUT int32_t *high, QX_OUT DBL1D scale);
 /** As MatrixBalance_head, for complex elements, whose size is taken as |re| + |im|. */
 QX_API ErrorCode CxMatrixBalance_head(QX_INOUT CDB2D a, int32_t job, QX_OUT int32_t *low,
                                       QX_OUT int32_t *high, QX_OUT DBL1D scale);
 
-/** Turns eigenvectors of a matrix that MatrixBalance_head has balanced, the columns of v, into those
-    of the original matrix; job, low, high and scale are those of that call. job: as
-    MatrixBalance_head. side: 0 right eigenvectors; 1 left ones. The vectors are not scaled to unit length.
-    Codes: ErrEmptyInput (v or scale is empty), ErrInvalidSelector (job is not 0 to 3, or side not 0 or
-    1), ErrSizeMismatch (scale has another length than v has rows), ErrIndexOutOfRange (not 1 <= low <=
-    high <= n, or an exchange is with no row of v), ErrOutOfMemory (no memory). */
+/** Turns eigenvectors of a matrix that MatrixBalance_head has balanced, the columns of v, into
+   those of the original matrix; job, low, high and scale are those of that call. job: as
+    MatrixBalance_head. side: 0 right eigenvectors; 1 left ones. The vectors are not scaled to unit
+   length. Codes: ErrEmptyInput (v or scale is empty), ErrInvalidSelector (job is not 0 to 3, or
+   side not 0 or 1), ErrSizeMismatch (scale has another length than v has rows), ErrIndexOutOfRange
+   (not 1 <= low <= high <= n, or an exchange is with no row of v), ErrOutOfMemory (no memory). */
 QX_API ErrorCode EigenVBack_head(int32_t job, int32_t side, int32_t low, int32_t high,
                                  QX_IN DBL1D scale, QX_INOUT DBL2D v);
 /** As EigenVBack_head, for complex vectors. */

@@ -69,10 +69,10 @@ QX_API ErrorCode PeakD2010(QX_INOUT PeakDRequest *request, QX_INOUT PeakDState *
     -c1 / (2 c2) where c1 changes its sign from one window to the next; for w below 5 in every
     window whose c2 has the sign that is sought. A vertex counts that lies within a quarter of the
     window from its centre and whose amplitude lies beyond the threshold, both in one of the two
-    windows. Of two less than a sample apart the more extreme one stays. The blocks that a stream comes
-    in change nothing but this: where the second of such two is more extreme and lies behind a seam,
-    both are told. The last w samples of a block are scanned with the next one, or with the last-block
-    flag.
+    windows. Of two less than a sample apart the more extreme one stays. The blocks that a stream
+   comes in change nothing but this: where the second of such two is more extreme and lies behind a
+   seam, both are told. The last w samples of a block are scanned with the next one, or with the
+   last-block flag.
 
     mode: 0 to 1 request->data is scanned; 2 `source` is, and request->data plays no part. Modes 1
     and 2 look for flat blocks: where the block and its history span less than 1e-8, their mean is

@@ -10,9 +10,9 @@
 
 QX_BEGIN_DECLS
 
-/** A matrix of a kind. kind: 0 identity of order *size; 1 diagonal with x; 2 Toeplitz with x as first
-    column and y[1], y[2] ... as the rest of the first row (y[0] is not read); 3 Vandermonde, whose
-    row i is the powers of x[i] from the highest to 1; 4 companion of the polynomial with the
+/** A matrix of a kind. kind: 0 identity of order *size; 1 diagonal with x; 2 Toeplitz with x as
+   first column and y[1], y[2] ... as the rest of the first row (y[0] is not read); 3 Vandermonde,
+   whose row i is the powers of x[i] from the highest to 1; 4 companion of the polynomial with the
     coefficients x, the leading one first: -x[j+1] / x[0] in the first row, ones below the
     diagonal. What a kind does not need is not looked at.
     Codes: ErrEmptyInput (kinds 0 to 3: the size is below 1), ErrFewerThanTwo (kind 4: x has fewer
@@ -94,11 +94,11 @@ QX_API int32_t CreateMatrixFromEVs_head(QX_IN DBL1D values, QX_OUT DBL2D out,
                                         QX_OUT ErrorCode *err);
 
 /** Correlation matrix of order maxLag + 1, out[i][j] = r(i - j): r(k) is the sum over i of x[i +
-    k] conj(y[i]) where both exist, normalized. normalization: as Rxy80. With y = x it is the autocorrelation matrix, symmetric or
-    Hermitian.
-    Codes: ErrEmptyInput (x or y is empty), ErrSizeMismatch (the lengths differ),
-    ErrIndexOutOfRange (maxLag is below 0 or not below n), ErrInvalidSelector (normalization is not
-    0, 1 or 2), ErrOutOfMemory (no memory, or the host refused the resize). */
+    k] conj(y[i]) where both exist, normalized. normalization: as Rxy80. With y = x it is the
+   autocorrelation matrix, symmetric or Hermitian. Codes: ErrEmptyInput (x or y is empty),
+   ErrSizeMismatch (the lengths differ), ErrIndexOutOfRange (maxLag is below 0 or not below n),
+   ErrInvalidSelector (normalization is not 0, 1 or 2), ErrOutOfMemory (no memory, or the host
+   refused the resize). */
 QX_API ErrorCode AutoCorrMtrxH(QX_IN DBL1D x, QX_IN DBL1D y, int32_t maxLag, int32_t normalization,
                                QX_OUT DBL2D out);
 /** As AutoCorrMtrxH, for complex data. */
