@@ -152,7 +152,8 @@ class Values(unittest.TestCase):
        0  (x[i] - 1) / 2.5      one value      12 wide
        1  x[i]                  none */
 /** kind: 1; 7. Others are (kind: 5. no). */ QX_API void first(int32_t kind, QX_IN const int32_t *shape);
-/** As first, at a place. place: 2 to 3 both; 5 last. */ QX_API void second(int32_t kind, uint16_t place);
+/** As first, at a place. place, end: 2 to 3 both; 5 last. */
+QX_API void second(int32_t kind, uint16_t place, int32_t end);
 /** kind: as second. shape: one of many. */ QX_API void third(int32_t kind, double shape);
 /** Of a kind. */ QX_API void fourth(int32_t kind, QX_OUT int32_t *shape);
 """
@@ -161,7 +162,7 @@ class Values(unittest.TestCase):
         kinds = [(0, "plain"), (1, "round, or (2; 3) so"), (7, "as x[1] ... x[n]")]
         self.assertEqual([[a.get("values") for a in e["arguments"]] for e in exports], [
             [kinds[1:], [(0, "(x[i] - 1) / 2.5"), (1, "x[i]"), (12, "wide")]],
-            [kinds[1:], [(2, "both"), (3, "both"), (5, "last")]], [kinds[1:], None], [kinds, None]])
+            [kinds[1:], *2 * [[(2, "both"), (3, "both"), (5, "last")]]], [kinds[1:], None], [kinds, None]])
 
 
 class Refusing(unittest.TestCase):

@@ -23,6 +23,7 @@ and a colon, or in an indented table behind such a colon. The values ascend in a
 semicolon between them; a range has one text:
 
     type: 0 lowpass; 1 highpass, with its cut-off fl; 2 to 5 reserved.
+    from, to: 0 Cartesian; 1 spherical.
     form: as IIR_Filter2.
 
 In the introduction of a header it holds for all exports there that have such an argument; a value
@@ -358,7 +359,7 @@ def values_of(documentation, name):
     if match := re.search(rf"\b{name}:\n\n((?: {{3,}}\S.*\n?)+)", documentation):
         return values_in_table(match[1], name)
     text = " ".join(documentation.split())
-    match = re.search(rf"(?:^|[.)] ){name}: (as (\w+)\.|(?=\d))", text)
+    match = re.search(rf"(?:^|[.)] )(?:\w+, )*{name}(?:, \w+)*: (as (\w+)\.|(?=\d))", text)
     if not match:
         return None
     if match[2]:

@@ -12,9 +12,9 @@
                 | 0 -s  c |             | s  0  c |             |  0  0  1 |
 
    Three Euler angles turn the system three times, each time about an axis of the system as it has
-   been turned so far; `sequence` names the axes in the order of the angles:
+   been turned so far, in the order of the angles by sequence:
 
-       0 XYX, 1 XYZ, 2 XZX, 3 XZY, 4 YXY, 5 YXZ, 6 YZX, 7 YZY, 8 ZXY, 9 ZXZ, 10 ZYX, 11 ZYZ
+       0 XYX   1 XYZ   2 XZX   3 XZY   4 YXY   5 YXZ   6 YZX   7 YZY   8 ZXY   9 ZXZ   10 ZYX   11 ZYZ
 
    and the direction matrix is R = R3 R2 R1. For example, with angles 1, 2, 3 as indices of c and s,
    under sequence 10 (ZYX: yaw, pitch, roll) R is
@@ -86,9 +86,8 @@ QX_API ErrorCode Direction2Euler2011_head(QX_IN DBL2D direction, int32_t sequenc
                                           QX_OUT double *angle1, QX_OUT double *angle2,
                                           QX_OUT double *angle3);
 
-/** Converts points between kinds of coordinates, given by `from` and `to`: 0 Cartesian (x, y, z), 1
-    spherical (radius, azimuth, inclination from the positive z axis), 2 cylindrical (radius, azimuth,
-    height). Spherical to Cartesian: x = radius sin(inclination) cos(azimuth), y = radius
+/** Converts points between kinds of coordinates. from, to: 0 Cartesian (x, y, z); 1 spherical (radius,
+    azimuth, inclination from the positive z axis); 2 cylindrical (radius, azimuth, height). Spherical to Cartesian: x = radius sin(inclination) cos(azimuth), y = radius
     sin(inclination) sin(azimuth), z = radius cos(inclination). Results have radii of at least 0,
     azimuths above -pi and at most pi, inclinations in 0 to pi; azimuth and inclination are 0 where
     they have no meaning. Inputs need not keep to these ranges. Where `from` and `to` are the same the
