@@ -168,8 +168,9 @@ def _link(name):
 
 
 def _check(pairs, folder, force):
+    inputs = outputs.identities(path for _, path in pairs)
     for name in ("index", *(name for name, _ in pairs)):
-        outputs.check(os.path.join(folder, f"{name}.html"), force, "report", [path for _, path in pairs])
+        outputs.check(os.path.join(folder, f"{name}.html"), force, "report", inputs)
 
 
 def write(paths, folder, options, workers=None, scheduler=None, tell=lambda outcome: None, start=None,

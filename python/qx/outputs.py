@@ -42,16 +42,25 @@ def _is_file(path):
     return os.path.exists(path) and stat.S_ISREG(os.stat(path).st_mode)
 
 
-def check(path, force=False, command=None, inputs=()):
-    """Refuses a path that must not be written. `inputs` are the files that are read: they are never
-    replaced, by whatever name or link. What stands there already is replaced with `force`, or where
-    it has the mark of `command`."""
+def identity(path):
+    """What all names and links of a file share."""
+    status = os.stat(path)
+    return status.st_dev, status.st_ino
+
+
+def identities(paths):
+    return {identity(path) for path in paths if os.path.exists(path)}
+
+
+def check(path, force=False, command=None, inputs=frozenset()):
+    """Refuses a path that must not be written. `inputs` has the identities of the files that are read:
+    they are never replaced. What stands there already is replaced with `force`, or where it has the
+    mark of `command`."""
     path = os.fspath(path)
     if not os.path.exists(path):
         return
-    for source in inputs:
-        if os.path.exists(source) and os.path.samefile(source, path):
-            raise Exists(f"{path}: is the file that is read, and is never replaced")
+    if identity(path) in inputs:
+        raise Exists(f"{path}: is a file that is read, and is never replaced")
     if os.path.isdir(path):
         raise Exists(f"{path}: is a folder")
     if _is_file(path) and not force and not (command and is_marked(path, command)):
@@ -68,7 +77,10 @@ def whole(path):
         return
     folder, name = os.path.split(path)
     part = os.path.join(folder, f".{os.getpid()}.part.{name}")
-    os.close(os.open(part, os.O_WRONLY | os.O_CREAT | os.O_EXCL, 0o666))
+    try:
+        os.close(os.open(part, os.O_WRONLY | os.O_CREAT | os.O_EXCL, 0o666))
+    except OSError as error:
+        raise OSError(f"{path}: cannot be written: {error.strerror}") from None
     _unfinished.add(part)
     try:
         yield part

@@ -122,6 +122,6 @@ def resample_file(source, target, rate, progress=lambda frames: None):
                 put(out, resampler.put(frames))
                 progress(len(frames))
             put(out, resampler.end())
-    except (soundfile.SoundFileError, OSError) as error:
-        raise OSError(f"{target}: cannot be written: {getattr(error, 'strerror', None) or error}") from None
+    except soundfile.SoundFileError as error:
+        raise OSError(f"{target}: cannot be written: {error}") from None
     return resampler

@@ -116,7 +116,7 @@ class Outputs(InAFolder):
                 with self.subTest(name=name, command=before[0]):
                     code, text = self.run_command(*before, name, *after, "--force")
                     self.assertEqual(code, 2)
-                    self.assertIn("is the file that is read", text)
+                    self.assertIn("is a file that is read", text)
                     self.assertEqual(Path(source).read_bytes(), content)
 
     def test_a_file_appears_when_it_is_whole(self):
@@ -130,6 +130,8 @@ class Outputs(InAFolder):
         self.assertTrue(os.path.islink("link.csv"))
         self.assertEqual(Path("elsewhere.csv").read_text(), "all of it")
         self.assertEqual(self.run_command("peaks", ECG, "--csv", "/dev/null")[0], 0)
+        self.assertEqual(self.run_command("generate", "sine", "no/sine.csv"), (
+            2, f"qx: {os.path.realpath('no/sine.csv')}: cannot be written: No such file or directory\n"))
 
 
 def alive(group):

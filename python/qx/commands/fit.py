@@ -31,7 +31,7 @@ def values(texts):
 def fit(options):
     from .. import fitting, outputs
     path = options.plot or os.path.join("out", "fit.svg")
-    outputs.check(path, options.force, "fit", [options.file])
+    outputs.check(path, options.force, "fit", outputs.identities([options.file]))
     model = fitting.model_of(options.model, options.order)
     fixed = values(options.fix)
     told = fitting.Options(METHODS.index(options.method), values(options.guess),

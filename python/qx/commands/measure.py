@@ -59,7 +59,7 @@ def show_table(names, rows):
 def opened(options):
     from .. import outputs, recording
     if options.csv:
-        outputs.check(options.csv, options.force, inputs=[options.file])
+        outputs.check(options.csv, options.force, inputs=outputs.identities([options.file]))
     read = recording.read(options.file, rate=options.rate, column=options.column)
     step = 1 / read.rate if read.rate else 1.0
     return read, step

@@ -25,7 +25,7 @@ def report_on(options):
         return report_on_many(options, reading)
     from .. import outputs, recording, report
     path = os.path.join(options.output, "report.html")
-    outputs.check(path, options.force, "report", options.files)
+    outputs.check(path, options.force, "report", outputs.identities(options.files))
     for line in report.write(recording.read(options.files[0], **reading), path):
         print(line)
     print(f"\nThe report with plots: {path}")

@@ -30,7 +30,7 @@ def resample(options):
 
     from .. import outputs
     from ..resampling import opened, resample_file
-    outputs.check(options.target, options.force, inputs=[options.source])
+    outputs.check(options.target, options.force, inputs=outputs.identities([options.source]))
     with opened(options.source) as source:
         # A file that is done within a second needs no bar.
         with tqdm.tqdm(total=source.frames, unit=" frames", unit_scale=True, delay=1, leave=False,
