@@ -24,7 +24,7 @@ class Peaks:
     places: np.ndarray
     values: np.ndarray
     curvatures: np.ndarray  # second derivatives, per sample squared
-    prominences: np.ndarray | None = None  # where they were asked for
+    prominences: "np.ndarray | None" = None  # where they were asked for
     prominence: float = 0.0  # the least that was
 
 
@@ -70,29 +70,31 @@ def outstanding(found):
     return max(0.4 * greatest[-1], 0.2 * greatest[0]) if len(greatest) else 0.0
 
 
-def vertex(values, at, width):
-    """Place, height and curvature of the parabola through `width` samples around `at`, where it has its
-    vertex among them; else of the sample."""
-    first = min(max(0, at - width // 2), len(values) - width)
-    c0, c1, c2 = call("PolyFit_head", np.arange(width) - (at - first), values[first:first + width], 2, 0)[1]
-    if c2 < 0 and abs(c1) <= -c2 * width:
-        return at - c1 / (2 * c2), c0 - c1**2 / (4 * c2), 2 * c2
-    return float(at), values[at], 2 * c2
+def vertices(values, maxima, frame):
+    """Places, heights and curvatures of the parabolas through `frame` samples around each maximum,
+    where they have their vertex among them; else of the sample."""
+    fit = call("SavitzkyGolayCoefH", 2, frame, [], 1)[1]
+    first = np.clip(maxima - frame // 2, 0, len(values) - frame)
+    c0, c1, c2 = fit @ np.lib.stride_tricks.sliding_window_view(values, frame)[first].T
+    with np.errstate(divide="ignore", invalid="ignore"):
+        shift = -c1 / (2 * c2)
+    is_inside = (c2 < 0) & (np.abs(shift) <= frame / 2)
+    return (np.where(is_inside, first + frame // 2 + shift, maxima),
+            np.where(is_inside, c0 + c1 * shift / 2, values[maxima]), 2 * c2)
 
 
 def prominent_peaks(values, width, prominence=None):
     """Peaks of the values, smoothed by parabolas over `width` samples, of this prominence at least; of
     outstanding() prominence where it is None."""
-    smooth = call("SavitzkyGolayFiltH", values, 2, width + (width + 1) % 2, [])
+    frame = width + (width + 1) % 2
+    smooth = call("SavitzkyGolayFiltH", values, 2, frame, [])
     maxima = local_maxima(smooth)
     stand = prominences(smooth, maxima)
     if prominence is None:
         prominence = outstanding(stand)
     rounding = 64 * np.finfo(float).eps * np.abs(values).max()
     kept = stand >= max(prominence, rounding)
-    places, heights, curvatures = np.array(
-        [vertex(values, at, width) for at in maxima[kept].tolist()]).reshape(-1, 3).T
-    return Peaks(places, heights, curvatures, stand[kept], prominence)
+    return Peaks(*vertices(values, maxima[kept], frame), stand[kept], prominence)
 
 
 def peaks_beyond(values, threshold, width, valleys):

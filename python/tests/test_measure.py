@@ -72,7 +72,9 @@ class Peaks(unittest.TestCase):
                 self.assertEqual(len(measuring.peaks(x).places), expected)
                 self.assertEqual(len(measuring.peaks(-x, valleys=True).places), expected)
         found = measuring.peaks(np.sin(slow) + 2.0 * (t > 5), prominence=1.0, threshold=2.0)
-        self.assertEqual(len(found.places), 25)
+        np.testing.assert_allclose(found.places, 5050 + 200 * np.arange(25), atol=1e-6)
+        np.testing.assert_allclose(found.values, 3, rtol=1e-6)
+        np.testing.assert_allclose(found.curvatures, -(2 * np.pi * 5 / 1000)**2, rtol=1e-3)
 
     def test_threshold_and_polarity(self):
         x = np.tile([0, 0, 0, 0, 0, 0, 1, 3, 1, 0, 0, 0, 0, -2, 0], 20)
