@@ -1,71 +1,300 @@
-"""What a new user is told on a machine where something is missing.
+"""What a new user sees of the set-up and the first build: what is missing, how far it is, why it fails,
+and that it ends when it is told to.
 
     first_run_test.py SOURCE [TEST...]
+
+The tests named Terminal need a pseudo-terminal; where there is none they end with 77, which is the
+mark of a test that has not run.
 """
 
+import contextlib
+import fcntl
 import os
+import pty
+import re
+import select
+import shutil
+import signal
 import stat
 import subprocess
 import sys
 import tempfile
+import termios
+import time
 import unittest
 from pathlib import Path
 
-SOURCE = Path(sys.argv.pop(1))
+SOURCE = Path(sys.argv.pop(1)).resolve()
+SKIPPED = 77
+# The promise is a second; other tests run at the same time.
+PROMPT = 2.0
 
 
-class Told(unittest.TestCase):
+def machine_cache():
+    script = f'. "{SOURCE}/tools/setup/common.sh"; echo "$CACHE"'
+    return Path(subprocess.run(["bash", "-c", script], capture_output=True, text=True,
+                               check=True).stdout.strip())
+
+
+def processes_with(text):
+    """The processes that have the text in their environment."""
+    found = []
+    for entry in Path("/proc").glob("[0-9]*"):
+        with contextlib.suppress(OSError):
+            if text.encode() in (entry / "environ").read_bytes():
+                command = (entry / "cmdline").read_bytes().replace(b"\0", b" ").decode(errors="replace")
+                if command:  # a process that has ended is still listed, without one
+                    found.append(f"{entry.name}: {command[:100]}")
+    return found
+
+
+class Terminal:
+    """A command on a terminal of its own."""
+
+    def __init__(self, *command, **more):
+        self.master, slave = pty.openpty()
+
+        def take():
+            os.setsid()
+            fcntl.ioctl(slave, termios.TIOCSCTTY, 0)
+
+        self.process = subprocess.Popen(list(map(str, command)), stdin=slave, stdout=slave, stderr=slave,
+                                        preexec_fn=take, **more)
+        os.close(slave)
+        self.text = ""
+
+    def read(self, until=None, seconds=60):
+        """Reads until a pattern is found, or to the end."""
+        limit = time.monotonic() + seconds
+        while time.monotonic() < limit and not (until and re.search(until, self.text)):
+            if select.select([self.master], [], [], 0.1)[0]:
+                try:
+                    self.text += os.read(self.master, 4096).decode(errors="replace")
+                except OSError:
+                    break  # the other side is closed
+        return self.text
+
+    def type(self, text):
+        os.write(self.master, text.encode())
+
+    def close(self):
+        os.close(self.master)
+        return self.process.wait()
+
+
+class Case(unittest.TestCase):
     def setUp(self):
         folder = tempfile.TemporaryDirectory()
         self.addCleanup(folder.cleanup)
         self.folder = Path(folder.name)
         self.programs = self.folder / "bin"
         self.programs.mkdir()
+        self.cache = self.folder / "cache"
+        self.environment = {**os.environ, "PATH": f"{self.programs}:{os.environ['PATH']}",
+                            "QX_CACHE": str(self.cache)}
+        self.environment.pop("QX_WATCHED", None)
 
     def program(self, name, text):
-        """A program of this name that stands before the machine's."""
+        """A program of this name that is found before the machine's."""
         path = self.programs / name
         path.write_text(f"#!/bin/bash\n{text}\n", "utf-8")
         path.chmod(path.stat().st_mode | stat.S_IXUSR)
 
-    def run_script(self, *command):
-        environment = {**os.environ, "PATH": f"{self.programs}:{os.environ['PATH']}",
-                       "QX_CACHE": str(self.folder / "cache")}
-        return subprocess.run(list(map(str, command)), capture_output=True, text=True, env=environment)
+    def take_from_cache(self, *names):
+        """What the machine has of these is there from the start."""
+        self.cache.mkdir(exist_ok=True)
+        for name in names:
+            (self.cache / name).symlink_to(machine_cache() / name)
 
-    def test_missing_packages_without_root(self):
+    def fresh_copy(self):
+        copy = self.folder / "copy"
+        shutil.copytree(SOURCE, copy, symlinks=True,
+                        ignore=shutil.ignore_patterns("build", "out", ".git", "__pycache__"))
+        return copy
+
+    def run_script(self, *command):
+        return subprocess.run(list(map(str, command)), capture_output=True, text=True,
+                              env=self.environment)
+
+    def watched(self, text):
+        return ["bash", "-c", f'. "{SOURCE}/tools/setup/common.sh"; {text}']
+
+    def last_line(self, ran):
+        return ran.stderr.strip().split("\n")[-1]
+
+    def nothing_runs(self):
+        self.assertEqual(processes_with(f"QX_CACHE={self.cache}"), [])
+
+
+class Missing(Case):
+    def test_packages_without_root(self):
         self.program("dpkg-query", "exit 1")
         self.program("id", "echo 1000")
         ran = self.run_script(SOURCE / "tools/setup/native")
         self.assertEqual((ran.returncode, ran.stderr.count("\n")), (1, 1), ran.stderr)
         self.assertRegex(ran.stderr, "As root: apt-get update && apt-get install build-essential .*python3")
 
-    def test_no_network(self):
-        self.program("apt-get", "echo 'Could not resolve'; exit 100")
+    def test_network(self):
+        self.program("apt-get", "echo 'E: Could not resolve'; exit 100")
         ran = self.run_script(SOURCE / "tools/setup/libm", "linux")
         self.assertEqual(ran.returncode, 1)
-        self.assertRegex(ran.stderr.strip().split("\n")[-1],
+        self.assertIn("E: Could not resolve", ran.stderr)
+        self.assertRegex(self.last_line(ran),
                          r"source package musl is needed and cannot be fetched.*source-musl\.log")
         self.program("dpkg-query", "exit 1")
+        self.program("dpkg", "exit 0")
         self.program("id", "echo 0")
         ran = self.run_script(SOURCE / "tools/setup/native")
         self.assertEqual(ran.returncode, 1)
-        self.assertRegex(ran.stderr.strip().split("\n")[-1], r"apt-get install .* failed: .*apt-install\.log")
+        self.assertRegex(self.last_line(ran), r"installing packages failed: .*apt-install\.log")
 
-    def test_progress_and_the_end_of_a_command_are_told(self):
-        script = f'. "{SOURCE}/tools/setup/common.sh"; watched work "{self.folder}/log" '
-        slow = "bash -c 'echo [1/3]; sleep 1.2; echo [2/3]; exit 3'"
-        ran = self.run_script("script", "-qec", f"bash -c {self.quoted(script + slow)}", "/dev/null")
-        self.assertEqual(ran.returncode, 3)
-        self.assertRegex(ran.stdout, r"work: \d s \[1/3\]")
-        self.assertRegex(ran.stdout, r"work: done in \d s")
-        ran = self.run_script("bash", "-c", script + "true")
+    def test_no_network_is_needed_where_the_cache_has_all(self):
+        self.take_from_cache("src", "lapack", "openblas", "libm")
+        self.program("apt-get", "echo 'E: Could not resolve'; exit 100")
+        for script in ("native", "libm", "lapack", "openblas"):
+            ran = self.run_script(SOURCE / "tools/setup" / script, *["linux"] * (script != "native"))
+            self.assertEqual((ran.returncode, ran.stderr), (0, ""))
+
+
+class Failing(Case):
+    def setUp(self):
+        super().setUp()
+        self.take_from_cache("src")
+        for name in ("gfortran", "gcc"):
+            self.program(name, f'[ "$1" = -dumpfullversion ] && exec /usr/bin/{name} "$1"\n'
+                         "echo 'x:1:1: Error: made up' >&2; exit 1")
+        self.program("make", "echo 'x:1:1: Error: made up' >&2; exit 1")
+
+    def test_the_lines_of_the_compiler_are_shown(self):
+        for script in ("lapack", "libm", "openblas"):
+            ran = self.run_script(SOURCE / "tools/setup" / script, "linux")
+            self.assertEqual(ran.returncode, 1)
+            self.assertIn("\nx:1:1: Error: made up\n", ran.stderr)
+            self.assertRegex(self.last_line(ran), rf"failed: all of it is in .*{script}-linux\.log")
+            self.assertEqual(list(self.cache.glob(f"{script}/*/*.a")), [])
+
+    def test_the_first_run_shows_them_too(self):
+        (self.programs / "gcc").unlink()
+        self.take_from_cache("libm")
+        ran = self.run_script(self.fresh_copy() / "run")
+        self.assertEqual(ran.returncode, 1)
+        self.assertIn("\nx:1:1: Error: made up\n", ran.stderr)
+        self.assertRegex(self.last_line(ran), r"\[run\] building the library failed: .*build/run\.log")
+
+
+class Telling(Case):
+    def test_nothing_is_silent_without_a_terminal(self):
+        script = f'told=$((SECONDS - 9)); watched work "{self.folder}/log" '
+        slow = "bash -c 'echo [1/3]; echo [2/3]; sleep 0.5; exit 3'"
+        ran = self.run_script(*self.watched(script + slow))
+        self.assertEqual((ran.returncode, ran.stdout), (3, ""))
+        self.assertRegex(ran.stderr, r"work: \d s \[2/3\]\n")
+        ran = self.run_script(*self.watched(f'watched work "{self.folder}/log" true'))
         self.assertEqual((ran.returncode, ran.stdout, ran.stderr), (0, "", ""))
 
-    @staticmethod
-    def quoted(text):
-        return "'" + text.replace("'", "'\\''") + "'"
+    def test_waiting_for_another_script_is_told(self):
+        first = subprocess.Popen(self.watched("lock_cache thing; echo; sleep 1"), env=self.environment,
+                                 stdout=subprocess.PIPE)
+        first.stdout.readline()
+        ran = self.run_script(*self.watched("lock_cache thing"))
+        self.assertRegex(ran.stderr, r"waiting for another script, which has .*thing\.lock")
+        first.communicate()
+
+
+class Stopping(Case):
+    def stopped(self, wait_for, stop, *command):
+        """Starts a command, stops it when the pattern is in a log or a message, and returns what it
+        wrote."""
+        output = self.folder / "output"
+        with output.open("w") as file:
+            process = subprocess.Popen(list(map(str, command)), env=self.environment, stdout=file,
+                                       stderr=file, start_new_session=True)
+            limit = time.monotonic() + 60
+            while process.poll() is None and time.monotonic() < limit and not wait_for():
+                time.sleep(0.05)
+            self.assertIsNone(process.poll(), output.read_text())
+            stop(process)
+            started = time.monotonic()
+            process.wait(30)
+            self.assertLess(time.monotonic() - started, PROMPT)
+        return process.returncode, output.read_text()
+
+    def test_a_signal_ends_all_that_was_started(self):
+        self.take_from_cache("src")
+        log = self.cache / "lapack-linux.log"
+        for number in (signal.SIGTERM, signal.SIGINT, signal.SIGHUP):
+            status, text = self.stopped(lambda: log.exists() and re.search(r"\[\d+/\d+\]", log.read_text()),
+                                        lambda process: process.send_signal(number),
+                                        SOURCE / "tools/setup/lapack", "linux")
+            self.assertEqual(status, -number)
+            self.assertRegex(text.strip().split("\n")[-1], r"^\[lapack\] stopped after \d+ s of building")
+            self.nothing_runs()
+            self.assertEqual(list(self.cache.glob("lapack/*/*.a")), [])
+            log.unlink()
+
+    def test_a_command_that_will_not_end_is_ended(self):
+        started = self.folder / "started"
+        program = f'trap "" TERM INT; touch "{started}"; while :; do sleep 9; done'
+        deaf = f"watched deaf '{self.folder}/log' bash -c '{program}'"
+        status, _ = self.stopped(started.exists, lambda process: process.terminate(), *self.watched(deaf))
+        self.assertEqual(status, -signal.SIGTERM)
+        self.nothing_runs()
+
+    def test_what_is_half_fetched_is_fetched_again(self):
+        half = "mkdir musl-1; touch musl-1/half; sleep 60"
+        self.program("apt-get", f'case "$*" in *source*musl) {half} ;; esac')
+        fetched = self.cache / "source.work/musl-1/half"
+        self.stopped(fetched.exists, lambda process: os.killpg(process.pid, signal.SIGKILL),
+                     SOURCE / "tools/setup/libm", "linux")
+        for line in processes_with(f"QX_CACHE={self.cache}"):
+            os.kill(int(line.split(":")[0]), signal.SIGKILL)
+        self.program("apt-get", "echo 'E: made up'; exit 100")
+        ran = self.run_script(SOURCE / "tools/setup/libm", "linux")
+        self.assertRegex(self.last_line(ran), "musl is needed and cannot be fetched")
+
+
+class OnATerminal(Case):
+    def test_progress_and_the_end_of_a_command_are_told(self):
+        slow = "bash -c 'echo [1/3]; sleep 1.2; echo [2/3]; exit 3'"
+        terminal = Terminal(*self.watched(f'watched work "{self.folder}/log" {slow}'),
+                            env=self.environment)
+        shown = terminal.read()
+        self.assertEqual(terminal.close(), 3)
+        self.assertRegex(shown, r"work: \d s \[1/3\]")
+        self.assertRegex(shown, r"work: failed in \d s")
+
+    def ended_by_ctrl_c(self, terminal, reached):
+        """Ends the first run where the pattern is shown."""
+        self.assertRegex(terminal.read(until=reached), reached)
+        time.sleep(1)
+        self.assertNotEqual(processes_with(f"QX_CACHE={self.cache}"), [])
+        started = time.monotonic()
+        terminal.text = ""
+        terminal.type("\x03")
+        shown = terminal.read(seconds=20)
+        self.assertLess(time.monotonic() - started, PROMPT)
+        self.assertEqual(terminal.close(), -signal.SIGINT)
+        lines = [line for line in re.split(r"[\r\n]+", shown.replace("^C", ""))
+                 if line.strip() and not line.startswith("building the library:")]
+        self.assertEqual(len(lines), 1, shown)
+        self.assertRegex(lines[0], r"^\[run\] stopped after \d+ s of building the library")
+        self.nothing_runs()
+
+    def test_ctrl_c_ends_the_first_run(self):
+        copy = self.fresh_copy()
+        self.take_from_cache("src", "libm")
+        self.ended_by_ctrl_c(Terminal(copy / "run", env=self.environment), r"\[lapack\]")
+        self.assertEqual(list(self.cache.glob("lapack/*/*.a")), [])
+        shutil.rmtree(self.cache)
+        self.take_from_cache("src", "libm", "lapack", "openblas")
+        self.ended_by_ctrl_c(Terminal(copy / "run", env=self.environment), r" \[[1-9]\d*/\d{3}\]")
 
 
 if __name__ == "__main__":
+    if "OnATerminal" in sys.argv:
+        try:
+            os.close(os.openpty()[0])
+        except OSError as error:
+            print(f"SKIPPED: there is no pseudo-terminal here ({error}); nothing has run")
+            sys.exit(SKIPPED)
     unittest.main()

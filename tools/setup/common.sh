@@ -3,53 +3,126 @@
 #   note TEXT...                a line of progress, on standard error
 #   fail TEXT...                says what is wrong and ends the script
 #   watched LABEL LOG COMMAND...   runs a command with its output in LOG, and tells how far it is
+#   must LABEL LOG COMMAND...      the same; a failure is shown and ends the script
+#   show_failure LOG            the lines of a log that tell why a build failed
+#   lock_cache NAME             waits until no other script holds this lock
 #   need_commands "PACKAGE..." COMMAND...   installs the packages where a command is missing
-#   debian_source PACKAGE       prints the folder of the unpacked Debian source package
+#   debian_source PACKAGE       sets `source` to the folder of the unpacked Debian source package
 
 CACHE=${QX_CACHE:-${XDG_CACHE_HOME:-${HOME:-/root}/.cache}/qxanalysis}
 mkdir -p "$CACHE"
 
-note() { echo "[$(basename "$0")] $*" >&2; }
+told=$SECONDS # when something was last written
+note() {
+    echo "[$(basename "$0")] $*" >&2
+    told=$SECONDS
+}
 fail() {
     note "$*"
     exit 1
 }
 
-# On a terminal a line that goes on changing, else a line now and then. How far a build is stands at
-# the end of its log as [12/345].
+# How far a command is, from the end of its log: [12/345] of a build, 12/34 of the tests, what apt is
+# at, or what a set-up script says.
+progress() {
+    tail -c 4096 "$1" | grep -aoE \
+        -e '^\[([0-9]+/[0-9]+\]|(libm|lapack|openblas|native|run)\].{1,60})' \
+        -e '^ *[0-9]+/[0-9]+ Test +#[0-9]+: [^ ]+' \
+        -e '^(Get:[0-9]+|(Unpacking|Setting up|I: [A-Z][a-z]+ing) [^ ]+)' | tail -n 1 || true
+}
+
+# On a terminal a line that goes on changing, else a line at least every ten seconds.
+#
+# The command runs in a process group of its own, so that Ctrl-C, or a signal that ends this script,
+# ends all that the command has started; within another watched command it stays in that one's group.
 watched() {
-    local label=$1 log=$2 start=$SECONDS told=$SECONDS status=0 far pid
+    local label=$1 log=$2 start=$SECONDS shown=-1 status=0 group=
     shift 2
-    "$@" >"$log" 2>&1 &
-    pid=$!
+    if [ -z "${QX_WATCHED:-}" ]; then
+        group=own
+        local signal
+        for signal in INT TERM HUP; do
+            # shellcheck disable=SC2064
+            trap "end_watched $signal \$! $start $(printf %q "$label")" "$signal"
+        done
+        set -m
+    fi
+    QX_WATCHED=yes "$@" >"$log" 2>&1 </dev/null &
+    local pid=$!
+    set +m
     while kill -0 "$pid" 2>/dev/null; do
-        sleep 0.5
-        far=$(tail -c 4096 "$log" | grep -aoE '^\[([0-9]+/[0-9]+\]|(libm|lapack|openblas)\].{1,50})' |
-            tail -n 1)
-        if [ -t 2 ]; then
-            printf '\r%s: %d s %-60s' "$label" $((SECONDS - start)) "$far" >&2
-        elif [ $((SECONDS - told)) -ge 30 ]; then
-            note "$label: $((SECONDS - start)) s $far"
-            told=$SECONDS
+        sleep 0.2
+        if [ -t 2 ] && [ $((SECONDS - start)) -gt "$shown" ]; then
+            shown=$((SECONDS - start))
+            printf '\r%s: %d s %-40.40s' "$label" "$shown" "$(progress "$log")" >&2
+        elif [ ! -t 2 ] && [ $((SECONDS - told)) -ge 9 ]; then
+            note "$label: $((SECONDS - start)) s $(progress "$log")"
         fi
     done
     wait "$pid" || status=$?
+    [ -z "$group" ] || trap - INT TERM HUP
     if [ -t 2 ] && [ $((SECONDS - start)) -gt 0 ]; then
-        printf '\r%s: done in %d s%60s\n' "$label" $((SECONDS - start)) '' >&2
+        local end="done"
+        [ "$status" = 0 ] || end=failed
+        printf '\r%s: %s in %d s%40s\n' "$label" "$end" $((SECONDS - start)) '' >&2
     fi
     return "$status"
 }
 
-# Without a prompt, and with fresh lists.
-apt_install() {
-    DEBIAN_FRONTEND=noninteractive apt-get update -qq &&
-        DEBIAN_FRONTEND=noninteractive apt-get install -y --no-install-recommends "$@"
+# Ends the group, politely for half a second, and then this script by the same signal.
+end_watched() {
+    local signal=$1 pid=$2 start=$3 label=$4
+    trap '' INT TERM HUP
+    kill -TERM -- "-$pid" 2>/dev/null || true
+    for _ in 1 2 3 4 5; do
+        sleep 0.1
+        kill -0 -- "-$pid" 2>/dev/null || break
+    done
+    { kill -KILL -- "-$pid" && wait "$pid" || true; } 2>/dev/null
+    [ ! -t 2 ] || printf '\r%78s\r' '' >&2
+    note "stopped after $((SECONDS - start)) s of $label"
+    trap - "$signal"
+    kill "-$signal" "$BASHPID"
 }
 
-# One set-up script at a time works in the cache: two builds may be configured at once.
+# What compilers, linkers, apt and cmake say of errors, with the lines around; without such lines the
+# end of the log.
+show_failure() {
+    local lines
+    lines=$(grep -aE -B 5 -A 3 -e '[Ee]rror: |[Ee]rror [0-9]+$|CMake Error|undefined reference' \
+        -e 'cannot find -l|^(E|Err): |^FAILED: |: not found$|[Nn]o space left|Killed' "$1" | head -n 60) || true
+    [ -n "$lines" ] || lines=$(tail -n 20 "$1")
+    printf '%s\n' "$lines" >&2
+}
+
+must() {
+    watched "$@" && return
+    show_failure "$2"
+    fail "$1 failed: all of it is in $2"
+}
+
+# Without a prompt, and with fresh lists. What a run that was killed has left half-installed is put
+# right first.
+apt_install() {
+    export DEBIAN_FRONTEND=noninteractive
+    dpkg --configure -a
+    apt-get update -qq -o DPkg::Lock::Timeout=60 &&
+        apt-get install -y --fix-broken --no-install-recommends -o DPkg::Lock::Timeout=60 "$@"
+}
+install_packages() {
+    must "installing $*" "$CACHE/apt-install.log" apt_install "$@"
+}
+
+# One script at a time works on a thing of the cache: two builds may be configured at once. The lock
+# is held until the script ends, or another file descriptor than 9 is closed.
 lock_cache() {
-    exec 9>"$CACHE/$1.lock"
-    flock 9
+    local name=$1 descriptor=${2:-9}
+    eval "exec $descriptor>\"\$CACHE/\$name.lock\""
+    flock -n "$descriptor" && return
+    note "waiting for another script, which has $CACHE/$name.lock"
+    until flock -w 9 "$descriptor"; do
+        note "still waiting"
+    done
 }
 
 need_commands() {
@@ -61,7 +134,7 @@ need_commands() {
     [ -n "$missing" ] || return 0
     [ "$(id -u)" = 0 ] || fail "missing:$missing. As root: apt-get update && apt-get install $packages"
     # shellcheck disable=SC2086
-    watched "installing $packages" "$CACHE/apt-install.log" apt_install $packages || fail "apt-get install $packages failed: $CACHE/apt-install.log"
+    install_packages $packages
 }
 
 # The machine's own Debian sources as source-package lines, Signed-By included, in a folder of
@@ -82,32 +155,41 @@ debian_source_lists() {
         fail "no Debian source among /etc/apt/sources.list*, so no source package can be fetched"
 }
 
+# One package at a time, for they share apt's lists.
 debian_source() {
-    local package=$1 source="$CACHE/src/$1" apt work unpacked
+    local package=$1
+    source="$CACHE/src/$package"
+    [ ! -f "$source/.complete" ] || return 0
+    lock_cache source 8
     if [ ! -f "$source/.complete" ]; then
         need_commands "dpkg-dev" dpkg-source
         note "fetching the source package $package"
-        apt="$CACHE/apt-source"
-        debian_source_lists "$apt"
-        local options=(-o Dir::Etc::sourcelist=/dev/null -o "Dir::Etc::sourceparts=$apt/parts"
-            -o "Dir::State::lists=$apt/lists" -o "Dir::Cache=$apt/cache"
-            -o APT::Sandbox::User= -o APT::Get::List-Cleanup=false -o Acquire::Languages=none
-            -o Acquire::Retries=3 -o DPkg::Lock::Timeout=60)
-        work=$(mktemp -d "$CACHE/src-XXXXXX")
-        (cd "$work" && apt-get "${options[@]}" update && apt-get "${options[@]}" source "$package") \
-            >"$CACHE/source-$package.log" 2>&1 ||
-            { rm -rf "$work"; fail "Debian's source package $package is needed and cannot be fetched (no" \
-                "network?): see $CACHE/source-$package.log, or copy $CACHE/src from another machine"; }
-        unpacked=$(find "$work" -mindepth 1 -maxdepth 1 -type d | head -n 1)
-        [ -n "$unpacked" ] || fail "the source package $package holds no folder"
-        dpkg-parsechangelog -l "$unpacked/debian/changelog" -S Version >"$unpacked/.version"
-        mkdir -p "$CACHE/src"
-        rm -rf "$source"
-        mv "$unpacked" "$source"
-        rm -rf "$work"
-        touch "$source/.complete"
+        if ! watched "fetching $package" "$CACHE/source-$package.log" fetch_source "$package"; then
+            show_failure "$CACHE/source-$package.log"
+            fail "Debian's source package $package is needed and cannot be fetched (no network?): see" \
+                "$CACHE/source-$package.log, or copy $CACHE/src from another machine"
+        fi
     fi
-    echo "$source"
+    exec 8>&-
+}
+
+# The mark of completeness is the last to be written: what a killed run leaves is made anew.
+fetch_source() {
+    local package=$1 apt="$CACHE/apt-source" work="$CACHE/source.work" unpacked
+    debian_source_lists "$apt" || return
+    local options=(-o Dir::Etc::sourcelist=/dev/null -o "Dir::Etc::sourceparts=$apt/parts"
+        -o "Dir::State::lists=$apt/lists" -o "Dir::Cache=$apt/cache"
+        -o APT::Sandbox::User= -o APT::Get::List-Cleanup=false -o Acquire::Languages=none
+        -o Acquire::Retries=3 -o DPkg::Lock::Timeout=60)
+    rm -rf "$work"
+    mkdir -p "$work" "$CACHE/src"
+    (cd "$work" && apt-get "${options[@]}" update && apt-get "${options[@]}" source "$package") || return
+    unpacked=$(find "$work" -mindepth 1 -maxdepth 1 -type d | head -n 1)
+    [ -n "$unpacked" ] || fail "the source package $package holds no folder"
+    dpkg-parsechangelog -l "$unpacked/debian/changelog" -S Version >"$unpacked/.version" || return
+    rm -rf "$CACHE/src/$package" && mv "$unpacked" "$CACHE/src/$package" &&
+        touch "$CACHE/src/$package/.complete"
+    rm -rf "$work"
 }
 
 # The mirror that the machine itself installs from.
@@ -117,4 +199,27 @@ debian_mirror() {
         awk '$2 == "bookworm" || $2 == "stable" { print $1; exit }')
     [ -n "$mirror" ] || fail "no Debian mirror among /etc/apt/sources.list*"
     echo "$mirror"
+}
+
+# For a Debian root of its own: sets `root` to its folder in the cache, under a lock. Ends the script
+# where it is known that the root cannot be made here.
+start_root() {
+    root="$CACHE/$1"
+    root_failed="$CACHE/$1.failed"
+    lock_cache "$1"
+    [ ! -f "$root/.complete" ] || return 0
+    # Not tried again at each of many tests.
+    if [ -n "$(find "$root_failed" -mmin -30 2>/dev/null)" ]; then
+        note "no root: $(cat "$root_failed"). To try again: rm $root_failed"
+        exit 77
+    fi
+    [ "$(id -u)" = 0 ] || give_up "a Debian root can be made by root only (debootstrap and chroot)"
+    (need_commands debootstrap debootstrap) || give_up "debootstrap is missing"
+}
+
+# Exit code 77 says that the root cannot be made here.
+give_up() {
+    note "$1"
+    echo "$1" >"$root_failed"
+    exit 77
 }
