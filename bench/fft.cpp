@@ -15,11 +15,12 @@ namespace {
 
 using qx::PlanReference;
 using qx::bench::Cell;
-using qx::bench::FFTWPlan;
 using qx::bench::LeastTimes;
 using qx::bench::Ratios;
 
 #ifdef QX_PEER_FFTW3
+using qx::bench::FFTWPlan;
+
 // FFTW over as many blocks of data as ours.
 class Peer {
 public:

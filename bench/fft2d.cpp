@@ -10,12 +10,13 @@
 
 namespace {
 
-using qx::bench::FFTWPlan;
 using qx::bench::HostMemory;
 using qx::bench::LeastTimes;
 using qx::bench::Ratios;
 
 #ifdef QX_PEER_FFTW3
+using qx::bench::FFTWPlan;
+
 FFTWPlan Peer(int32_t rows, int32_t cols, bool real, unsigned effort) {
     return {2 * std::size_t(rows) * cols, [=](double *in, double *out) {
                 fftw_complex *const to = FFTWPlan::Complex(out);

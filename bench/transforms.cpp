@@ -15,12 +15,13 @@
 
 namespace {
 
-using qx::bench::FFTWPlan;
 using qx::bench::HostMemory;
 using qx::bench::LeastTimes;
 using qx::bench::Ratios;
 
 #ifdef QX_PEER_FFTW3
+using qx::bench::FFTWPlan;
+
 FFTWPlan Peer(int32_t n, fftw_r2r_kind kind, unsigned effort) {
     return {std::size_t(n),
             [=](double *in, double *out) { return fftw_plan_r2r_1d(n, in, out, kind, effort); }};
