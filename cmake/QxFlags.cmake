@@ -21,3 +21,8 @@ if(QX_SANITIZE)
         -fno-sanitize-recover=all)
     target_link_options(qxflags INTERFACE -fsanitize=${QX_SANITIZE})
 endif()
+# A number that no integer holds stops a debug build where it is converted.
+if(NOT QX_SANITIZE)
+    target_compile_options(qxflags INTERFACE
+        $<$<CONFIG:Debug>:-fsanitize=float-cast-overflow -fsanitize-undefined-trap-on-error>)
+endif()

@@ -108,6 +108,8 @@ void TransposeInto(const CDB *a, int32_t rows, int32_t cols, CDB *out) {
 }
 
 int32_t OrderOfPacked(int32_t length) {
+    if (length < 0)
+        return -1;
     const auto n = static_cast<int32_t>(std::floor(std::sqrt(2.0 * length)));
     return PackedLength(n) == length ? n : -1;
 }

@@ -37,10 +37,10 @@ namespace {
 
 // Rounding may carry the last positions past the ends of the table; nothing is read there.
 double Nearest(const ResampleFilter &filter, double q) {
-    return filter.proto[std::clamp(static_cast<int32_t>(q + 0.5), 0, filter.len - 1)];
+    return filter.proto[std::clamp(Truncated(q + 0.5), 0, filter.len - 1)];
 }
 double Interpolated(const ResampleFilter &filter, double q) {
-    const int32_t i = std::max(0, static_cast<int32_t>(q));
+    const int32_t i = std::max(0, Truncated(q));
     if (i >= filter.len - 1)
         return filter.proto[filter.len - 1];
     return (filter.proto[i + 1] - filter.proto[i]) * (q - i) + filter.proto[i];

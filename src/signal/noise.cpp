@@ -258,18 +258,21 @@ void Refresh(BinomialCache &cache, int32_t trials, double q) {
     }
 }
 
-double BinomialByRejection(RandomStream &stream, double mean, const BinomialCache &cache) {
+// What the caller keeps decides how often a number is drawn, and never whether it is one of 0 to
+// trials.
+double BinomialByRejection(RandomStream &stream, int32_t trials, double mean,
+                           const BinomialCache &cache) {
     const double width = std::sqrt(2.0 * mean * cache.pc);
     while (true) {
         const double y = std::tan(kPi * stream.next());
         double v = width * y + mean;
-        if (v < 0.0 || !(v < cache.enOld + 1.0))
+        if (v < 0.0 || !(v < trials + 1.0))
             continue;
         v = std::floor(v);
         const double ratio = 1.2 * width * (1.0 + y * y) *
                              std::exp(cache.lnGammaEn1 - LnGammaFunction(v + 1.0) -
-                                      LnGammaFunction(cache.enOld - v + 1.0) + v * cache.logP +
-                                      (cache.enOld - v) * cache.logPc);
+                                      LnGammaFunction(trials - v + 1.0) + v * cache.logP +
+                                      (trials - v) * cache.logPc);
         if (!(stream.next() > ratio))
             return v;
     }
@@ -295,7 +298,7 @@ void BinomialNoise(U32 *x, int32_t n, int32_t trials, double p, RandomState &sta
         else if (byCounting)
             successes = BinomialByCounting(stream, trials, limit);
         else
-            successes = BinomialByRejection(stream, mean, cache);
+            successes = BinomialByRejection(stream, trials, mean, cache);
         x[i] = static_cast<uint32_t>(q != p ? trials - successes : successes);
     }
 }

@@ -226,6 +226,14 @@ TEST(Noises, GaussIsThePolarMethod) {
     }
 }
 
+// Whatever a caller left in the cache.
+TEST(Noises, BinomialStaysWithinTheTrials) {
+    RandomState state = start;
+    BinomialCache cache = {0.3, 0.7, 0.0, 0.0, 1000.0, 1e4, 100};
+    for (const double value : Binomial(3000, 100, 0.3, -1, state, cache))
+        ASSERT_LE(value, 100.0);
+}
+
 // The rejections as they are told, from the numbers of the one sequence in long double: they decide
 // which numbers are used, so a factor that is off by little leaves the stream.
 TEST(Noises, RejectionsUseTheNumbersAsTold) {
