@@ -83,6 +83,9 @@ QX_API ErrorCode PolyFit81_head(QX_IN DBL1D x, QX_IN DBL1D y, int32_t order, QX_
     values without those up to n times 2.2e-16 of the largest. Where columns depend on each other, 6
     gives the shortest of the solutions, and 0 one that rounding errors decide. Where wantCovariance
     is not 0, `covariance` is the inverse of H^T |W| H (not scaled by the MSE), else 0 by 0.
+    Algorithms 1 to 5 invert that matrix by its singular values, with loss of digits where its norm
+    is below 1 (SVD_head): for a condition number of H of 30 measured 2e-10 of the largest element
+    at a norm of 1e-4, 3e-6 at 1e-8 and 4e-2 at 1e-12; 0 and 6 lose none.
     Codes: ErrSizeMismatch (H, y and weights differ in length), ErrOutOfMemory (no memory, or the
     host refused a resize), ErrOrderNotPositive (H has no columns), ErrPolynomialOrderTooHigh (less
     rows than columns), ErrInvalidSelector (no such algorithm), ErrNonFiniteInput (H or a weight, or

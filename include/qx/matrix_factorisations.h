@@ -123,11 +123,14 @@ QX_API ErrorCode CxQRDecH(QX_IN CDB2D a, int32_t pivoting, int32_t economy,
 
 /** Singular value decomposition a = u diag(s) v^T of the m by n matrix a, k = min(m, n): a becomes u
     of m by k, s has k falling values, and v is n by k. G. H. Golub and C. Reinsch, "Singular value
-    decomposition and least squares solutions", 1970. The error of a value is a few n eps times the
-    largest one, but never less than about 2.2e-16: what is below that counts as zero, so a matrix
-    whose norm is far below 1 should be scaled up first.
-    Codes: ErrEmptyInput (a is empty), ErrOutOfMemory (no memory), ErrNonFiniteInput (an element is
-    not finite), ErrIterationLimit (100 iterations were not enough for a value). */
+    decomposition and least squares solutions", 1970. For norms from 1 on, u diag(s) v^T is off by a
+    few n eps times the norm. What is below 2.2e-16 counts as zero whatever the norm, so below 1 it is
+    off by up to 2.2e-16: relative to the norm 2e-10 at a norm of 1e-6, 2e-4 at 1e-12, and no digit is
+    right below 1e-15 (measured). Values lose digits later, relative to the largest one 1e-14 at 1e-8,
+    1e-6 at 1e-12 and 1e-2 at 1e-14. A matrix of a norm below 1 should be scaled up first, and so for
+    every export that stands on this decomposition. A value that overflows is infinite.
+    Codes: ErrEmptyInput (a is empty), ErrOutOfMemory (no memory), ErrNonFiniteInput (an element is not
+    finite), ErrIterationLimit (100 iterations were not enough for a value). */
 QX_API int32_t SVD_head(QX_INOUT DBL2D a, QX_OUT DBL1D s, QX_OUT DBL2D v, QX_OUT ErrorCode *err);
 /** As SVD_head, for complex elements: a = u diag(s) v^H. */
 QX_API int32_t CxSVD_head(QX_INOUT CDB2D a, QX_OUT DBL1D s, QX_OUT CDB2D v, QX_OUT ErrorCode *err);

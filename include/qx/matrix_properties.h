@@ -12,8 +12,8 @@ QX_BEGIN_DECLS
 
 /** Determinant of a square matrix. matrixType: 0 general (LU); 1 positive definite (Cholesky, of
     which the lower triangle is read); 2 lower triangular; 3 upper triangular (the product of the
-    diagonal). One of order 2 is computed by the formula whatever
-    the type. It is 0 for a matrix that is singular or, of type 1, not positive definite.
+    diagonal). One of order 2 is computed by the formula whatever the type. It is 0 for a matrix that
+    is singular or, of type 1, not positive definite. Products that overflow make it infinite or NaN.
     Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrInvalidSelector
     (*matrixType is not 0 to 3), ErrNonFiniteInput (a holds NaN or infinity), ErrOutOfMemory (no
     memory). */
@@ -24,7 +24,10 @@ QX_API int32_t CxDeterminant_head(QX_IN CDB2D a, QX_IN const int32_t *matrixType
                                   QX_OUT ErrorCode *err);
 
 /** Numerical rank: the number of singular values above *tolerance, which is max(m, n) times the
-    largest one times 2.2e-16 if negative. A failure leaves -1.
+    largest one times 2.2e-16 if negative. Where the norm of a is below 1, values that should vanish
+    are up to 2.2e-16 (SVD_head), which the default takes for rank: of 500 matrices of order 8 and
+    rank 4 it counts wrong in 41 at a norm of 0.01, 208 at 1e-6 and 463 at 1e-12 (measured); scale a
+    up, or give a tolerance. A largest value that overflows gives rank 0 then. A failure leaves -1.
     Codes: ErrEmptyInput (a is empty), ErrNonFiniteInput (a holds NaN or infinity), ErrOutOfMemory
     (no memory), ErrIterationLimit (the singular values do not converge). */
 QX_API int32_t Rank_head(QX_IN DBL2D a, QX_IN const double *tolerance, QX_OUT int32_t *rank,
@@ -35,7 +38,9 @@ QX_API int32_t CxRank_head(QX_IN CDB2D a, QX_IN const double *tolerance, QX_OUT 
 
 /** Condition number. normType: 0 the quotient of the largest and the smallest singular value, of
     any matrix; 1 to 3 the norm of a square matrix (as in Norm_head) times that of its inverse.
-    Infinity for a singular matrix, which is no failure.
+    Infinity for a singular matrix, which is no failure, and where the number overflows. Type 0
+    loses digits where the norm of a is far below 1 (SVD_head): for a condition number of 1000 it is
+    off by 6e-9 at a norm of 1e-8, 5e-4 at 1e-10 and 8e-2 at 1e-12 (measured).
     Codes: ErrEmptyInput (a is empty), ErrNonFiniteInput (a holds NaN or infinity),
     ErrInvalidSelector (*normType is not 0 to 3), ErrNotSquare (a is not square, of types 1 to 3),
     ErrOutOfMemory (no memory), ErrIterationLimit (the singular values do not converge). */
@@ -46,10 +51,13 @@ QX_API int32_t CxCondNumber_head(QX_IN CDB2D a, QX_IN const int32_t *normType, Q
                                  QX_OUT ErrorCode *err);
 
 /** Norm of a matrix. normType: 0 the largest singular value; 1 the largest column sum of moduli; 2
-    the root of the sum of squares (Frobenius); 3 the largest row sum of moduli.
+    the root of the sum of squares (Frobenius); 3 the largest row sum of moduli. Sums that overflow
+    give infinity, those of squares from elements of about 1e154 on; squares of elements below
+    1e-162 vanish. Type 0 loses digits where the norm is far below 1 (SVD_head): 7e-10 of it at
+    1e-10, 3e-7 at 1e-12 and 5e-3 at 1e-14 (measured).
     Codes: ErrEmptyInput (a is empty), ErrNonFiniteInput (a holds NaN or infinity),
-    ErrInvalidSelector (*normType is not 0 to 3), ErrOutOfMemory (no memory), ErrIterationLimit
-    (the singular values do not converge). */
+    ErrInvalidSelector (*normType is not 0 to 3), ErrOutOfMemory (no memory), ErrIterationLimit (the
+    singular values do not converge). */
 QX_API int32_t Norm_head(QX_IN DBL2D a, QX_IN const int32_t *normType, QX_OUT DBL *norm,
                          QX_OUT ErrorCode *err);
 /** As Norm_head, for complex data. */
@@ -70,7 +78,8 @@ QX_API int32_t DotProduct_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_OUT DBL *dot,
 QX_API int32_t DotprodCx(QX_IN CDB1D x, QX_IN CDB1D y, QX_OUT CDB *dot, QX_OUT ErrorCode *err);
 
 /** p-norm (sum of |x[i]|^p)^(1/p), also for negative p; the largest |x[i]| for p = +infinity, the
-    smallest for p = -infinity. Sums and powers may overflow.
+    smallest for p = -infinity. NaN if x holds NaN, whatever p. Sums and powers that overflow give
+    infinity, squares from elements of about 1e154 on; squares of elements below 1e-162 vanish.
     Codes: ErrEmptyInput (x is empty), ErrNonFiniteInput (p is NaN), ErrTooFewWeights (p is 0). */
 QX_API ErrorCode vectorNormH(QX_IN DBL1D x, double p, QX_OUT DBL *norm);
 /** As vectorNormH, for complex data. */
@@ -129,9 +138,9 @@ QX_API ErrorCode CxCheckPosSemiDef_head(QX_IN CDB2D a, double tolerance,
 
 /** Coefficients of det(t - a), ascending: poly has one element more than a has rows, the last one
     is 1. They are multiplied up from the eigenvalues.
-    Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrOutOfMemory (no memory,
-    or the host refused the resize), ErrNonFiniteInput (a holds NaN or infinity), ErrIterationLimit
-    (the eigenvalues do not converge). */
+    Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrOutOfMemory (no memory, or
+    the host refused the resize), ErrNonFiniteInput (a holds NaN or infinity), ErrIterationLimit
+    (the eigenvalues do not converge), ErrOverflow (a coefficient overflows). */
 QX_API int32_t MatrixCharacteristicPoly_head(QX_IN DBL2D a, QX_OUT DBL1D poly,
                                              QX_OUT ErrorCode *err);
 /** As MatrixCharacteristicPoly_head, for complex data. */

@@ -27,7 +27,16 @@ QX_API ErrorCode PolyRootsNtBst_head(QX_IN DBL1D coef, QX_IN DBL1D realGuesses,
     says; coefficients of 0 at the top do not count. *maxIterations is how often a search may turn
     to another direction before it takes a step. Multiple and clustered roots are found as well as
     the coefficients tell them; CxMultPolyRoots_head is made for these. A search can be stuck where
-    the polynomial is flat to the last bit, as x^43 - 1 is around 0. The code is in *err.
+    the polynomial is flat to the last bit, as x^43 - 1 is around 0.
+
+    Roots are not improved on the whole polynomial, and nothing compares them with it. Where a
+    search comes upon a root much larger than those that are left, deflation multiplies rounding
+    errors by powers of it, and the others may lose all digits, with the code 0. Of 10000
+    polynomials of degree 25 with normal random coefficients, the product of the roots was off by
+    more than 1e-12 of the coefficients for 55, 1e-8 for 9, and 0.1 for 2; of 5000 of degree 50 for
+    63, 17 and 7; up to degree 10 it was within 1e-11. CxMultPolyRoots_head with refinement has no
+    deflation. Where squares of coefficients or quotients of them overflow, roots may be infinite or
+    NaN. The code is in *err.
     Codes: ErrEmptyInput (coef is empty), ErrBadCoefficients (a coefficient is NaN, or the
     polynomial is constant), ErrOutOfMemory (no memory, or the host refuses the resize),
     ErrNonFiniteFunction (a search came to NaN), ErrIterationLimit (a search does not converge). */
@@ -46,8 +55,14 @@ QX_API int32_t CxPolyRoots_head(QX_INOUT CDB1D coef, QX_IN const int32_t *maxIte
     `multiplicities` one number for each; all have one entry per distinct root. Without refinement
     `refined` is `simple`; with it the roots come by rising multiplicity and falling modulus. A root
     0 comes last. Where no structure fits or the refinement does not converge, the roots are
-    eigenvalues of the companion matrix. Up to degree 2, roots at 0 apart, each root counts once.
-    coef stays as it is, but a failure empties it as well.
+    eigenvalues of the companion matrix. Up to degree 2, roots at 0 apart, each root counts once;
+    there squares of coefficients or quotients that overflow make roots infinite or NaN. coef stays
+    as it is, but a failure empties it as well.
+
+    The time grows with the cube of the degree, and up to its fourth power where many divisors are
+    tried in vain; the memory is that of some 10 complex numbers times the square of the degree.
+    Measured with random coefficients: 0.3 s at degree 200, 12 s and some 75 MB at degree 700; with
+    coefficients that fall like exp(-k^2 / 7000) there 94 s.
     Codes: ErrEmptyInput (coef is empty), ErrOutOfMemory (no memory, or the host refuses an output),
     ErrBadCoefficients (a coefficient is not finite), ErrAllCoefficientsZero (all coefficients are
     0), ErrOrderNotPositive (the polynomial is constant), ErrNonFiniteInput (it overflows when it is

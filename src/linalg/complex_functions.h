@@ -12,6 +12,10 @@ inline CDB SquareRoot(CDB z) {
     const double modulus = Modulus(z);
     if (modulus == 0.0)
         return {0.0, z.im};
+    if (std::isinf(modulus) && std::isfinite(z.re) && std::isfinite(z.im)) {
+        const CDB half = SquareRoot(z * 0.25);
+        return half * 2.0;
+    }
     const double t = std::sqrt(0.5 * std::fabs(z.re) + 0.5 * modulus);
     if (z.re >= 0.0)
         return {t, z.im / (2.0 * t)};

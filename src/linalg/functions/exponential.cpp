@@ -11,6 +11,11 @@
 namespace qx {
 namespace {
 
+// How often a matrix of this finite norm is halved, to a norm below 1.
+int32_t Squarings(double norm) {
+    return norm < 0.5 ? 0 : static_cast<int32_t>(std::log(norm) / std::log(2.0) + 1.0);
+}
+
 template <ElementType E>
 class PadeExponential {
     typedef ElementOf<E> T;
@@ -26,13 +31,11 @@ public:
         double norm;
         if (const ErrorCode failed = MatrixNorm(a, n_, n_, infinityNorm, &norm))
             return failed;
-        int32_t squarings = 0;
-        double divisor = 1.0;
-        if (!(norm < 0.5)) {
-            squarings = static_cast<int32_t>(std::trunc(std::log(norm) / std::log(2.0) + 1.0));
-            divisor = std::pow(2.0, squarings);
-        }
-        const double factor = 1.0 / divisor;
+        if (!std::isfinite(norm))
+            return ErrNonFiniteInput;
+        const int32_t squarings = Squarings(norm);
+        // Directly, for 2^squarings itself may overflow.
+        const double factor = std::ldexp(1.0, -squarings);
         for (std::ptrdiff_t i = 0; i < count_; ++i)
             scaled()[i] = a[i] * factor;
         if (const ErrorCode failed = sumUp(PadeDegree(1e-8, norm), a))

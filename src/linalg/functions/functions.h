@@ -9,8 +9,8 @@ namespace qx {
 // and each may end with ErrOutOfMemory.
 
 // a becomes exp(a), by scaling, a Pade approximant and squaring (C. Moler and C. Van Loan,
-// "Nineteen dubious ways to compute the exponential of a matrix", 1978). ErrNonFiniteInput, but not
-// for a diagonal matrix.
+// "Nineteen dubious ways to compute the exponential of a matrix", 1978). ErrNonFiniteInput, also
+// where the largest row sum overflows, but not for a diagonal matrix.
 ErrorCode MatrixExponential(DBL *a, int32_t n);
 ErrorCode MatrixExponential(CDB *a, int32_t n);
 
@@ -19,8 +19,8 @@ ErrorCode MatrixExponential(CDB *a, int32_t n);
 int32_t PadeDegree(double tolerance, double norm);
 
 // a becomes its principal square root, through the Schur form with eigenvalues of falling modulus.
-// ErrNonFiniteInput, the codes of the Schur form; WarnLowAccuracy where two eigenvalues or more are
-// below 1e-12, for which there may be no root.
+// ErrNonFiniteInput, also where an eigenvalue overflows; the codes of the Schur form;
+// WarnLowAccuracy where two eigenvalues or more are below 1e-12, for which there may be no root.
 ErrorCode MatrixSquareRoot(CDB *a, int32_t n);
 // Of a real matrix.
 ErrorCode MatrixSquareRoot(const DBL *a, int32_t n, CDB *root);

@@ -2,6 +2,7 @@
 #include "linalg/complex_functions.h"
 #include "linalg/factorisations/schur.h"
 #include "linalg/functions/functions.h"
+#include "linalg/matrix.h"
 #include "linalg/products/products.h"
 
 namespace qx {
@@ -37,6 +38,8 @@ ErrorCode MatrixSquareRoot(CDB *a, int32_t n) {
     CDB *const u = blocks.data(), *const t = u + count, *const r = t + count, *const w = r + count;
     if (const ErrorCode failed = SchurDecompose(a, n, schurModulusDescending, u, t, w))
         return failed;
+    if (CheckFinite(t, count) != 0) // eigenvalues may be larger than the elements
+        return ErrNonFiniteInput;
     const ErrorCode status = n > 1 && AbsSum(w[n - 2]) < negligible ? WarnLowAccuracy : 0;
     TriangularSquareRoot(t, n, r);
     if (const ErrorCode failed = MatrixProductPlain(u, r, n, n, n, t))

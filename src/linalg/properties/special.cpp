@@ -79,6 +79,9 @@ ErrorCode PolynomialOfEigenvalues(const ElementOf<E> *a, int32_t n, CDB *polynom
     polynomial[0] = {1.0, 0.0};
     for (int32_t k = 0; k < n; ++k)
         MultiplyByFactor(polynomial, k, values[k]);
+    for (int32_t k = 0; k <= n; ++k)
+        if (!std::isfinite(polynomial[k].re) || !std::isfinite(polynomial[k].im))
+            return ErrOverflow;
     return 0;
 }
 

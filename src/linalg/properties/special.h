@@ -28,7 +28,7 @@ void FillWithEigenvalues(const DBL *values, int32_t n, DBL *out);
 
 // The coefficients of det(t - a), ascending, n + 1 of them, the last one 1: by the product of (t -
 // w) over the eigenvalues w.
-// ErrEmptyInput, ErrNonFiniteInput, ErrOutOfMemory, ErrIterationLimit.
+// ErrEmptyInput, ErrNonFiniteInput, ErrOutOfMemory, ErrIterationLimit, ErrOverflow.
 ErrorCode CharacteristicPolynomial(const DBL *a, int32_t n, DBL *polynomial);
 ErrorCode CharacteristicPolynomial(const CDB *a, int32_t n, CDB *polynomial);
 

@@ -11,12 +11,13 @@ namespace {
 
 constexpr double infinity = std::numeric_limits<double>::infinity();
 
+// NaN where one of the moduli is.
 template <ElementType E>
 double Extreme(const ElementOf<E> *x, int32_t n, bool largest) {
     double extreme = Modulus(x[0]);
-    for (int32_t i = 1; i < n; ++i) {
+    for (int32_t i = 1; i < n && extreme == extreme; ++i) {
         const double size = Modulus(x[i]);
-        if (largest ? size > extreme : size < extreme)
+        if (size != size || (largest ? size > extreme : size < extreme))
             extreme = size;
     }
     return extreme;

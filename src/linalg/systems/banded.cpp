@@ -30,7 +30,7 @@ ErrorCode Solve(const typename Element<E>::type *band, int32_t n, int32_t lower,
                 int32_t rightSides, typename Element<E>::type *b) {
     if (n < 1 || rightSides < 1)
         return ErrEmptyInput;
-    if (lower < 0 || upper < 0 || int64_t{lower} + upper > n)
+    if (lower < 0 || upper < 0 || int64_t{lower} + upper + 1 > n)
         return ErrSizesDisagree;
     AlignedScratch<E> storage, x;
     AlignedScratch<ElementType::I32> pivots;

@@ -377,6 +377,22 @@ TEST(Banded, SolvesLikeTheFullMatrix) {
     EXPECT_EQ(BandEqsDriH(zero.handle(), ones.handle(), 0, 0), ErrSingularMatrix);
 }
 
+// As many diagonals as the order has are allowed, and one more is not, though all might hold
+// elements.
+TEST(Banded, HasNoMoreDiagonalsThanItsOrder) {
+    const DBLMatrix band(3, 3, {9, 2, 2, 5, 5, 5, 1, 1, 9}), wide(3, 2, {9, 2, 5, 5, 1, 9});
+    const CDBMatrix zwide(3, 2, {{9, 0}, {2, 0}, {5, 0}, {5, 0}, {1, 0}, {9, 0}});
+    const DBLVector x({7, 8, 6}), b({1, 1});
+    EXPECT_EQ(BandEqsDriH(band.handle(), x.handle(), 1, 1), 0);
+    for (int i = 0; i < 3; ++i)
+        EXPECT_NEAR(x[i], 1.0, 1e-15);
+    EXPECT_EQ(BandEqsDriH(wide.handle(), b.handle(), 1, 1), ErrSizesDisagree);
+    EXPECT_EQ(b.size(), 0);
+    EXPECT_EQ(BandEqsSetDriH(wide.handle(), DBLMatrix(2, 2).handle(), 2, 0), ErrSizesDisagree);
+    EXPECT_EQ(CxBandEqsDriH(zwide.handle(), CDBVector(2).handle(), 1, 1), ErrSizesDisagree);
+    EXPECT_EQ(CxBandEqsSetDriH(zwide.handle(), CDBMatrix(2, 2).handle(), 0, 2), ErrSizesDisagree);
+}
+
 TEST(Tridiagonal, FactorsSolveForMatrixAndTranspose) {
     const int n = 20;
     const auto lower = Reals(n - 1, 1), diagonal = Reals(n, 2), upper = Reals(n - 1, 3);

@@ -7,6 +7,7 @@
 
 #include <gtest/gtest.h>
 
+#include <complex>
 #include <cstdlib>
 #include <fstream>
 #include <limits>
@@ -115,6 +116,32 @@ TEST(MatrixExponential, TakesADiagonalElementByElement) {
     EXPECT_NEAR(z[0].re, std::cos(3.0), 1e-16);
     EXPECT_NEAR(z[0].im, std::sin(3.0), 1e-16);
 }
+// 2^1024, by which such matrices are divided, is no number.
+TEST(MatrixExponential, OfTheLargestNormsIsInfiniteOrZero) {
+    ErrorCode err;
+    for (const double sign : {1.0, -1.0}) {
+        const std::vector<double> elements = {sign * 1.7e308, 1.0, 1.0, sign * 1.6e308};
+        const DBL2DArray a(2, 2, elements);
+        const CDB2DArray z(2, 2, {{elements[0], 0}, {1, 0}, {1, 0}, {elements[3], 0}});
+        MatrixExp_head(a.handle(), &err);
+        EXPECT_EQ(err, 0);
+        CxMatrixExp_head(z.handle(), &err);
+        EXPECT_EQ(err, 0);
+        for (int i = 0; i < 4; ++i) {
+            EXPECT_EQ(a[i], sign > 0 ? HUGE_VAL : 0.0) << sign;
+            EXPECT_EQ(std::isfinite(z[i].re), sign < 0);
+            EXPECT_NE(z[i].re, 1.0);
+        }
+    }
+    // The norm itself overflows.
+    const DBL2DArray a(2, 2, {1.7e308, 1e308, 1.0, 0.0});
+    const CDB2DArray z(2, 2, {{1.7e308, 1e308}, {1, 0}, {0, 0}, {0, 0}});
+    MatrixExp_head(a.handle(), &err);
+    EXPECT_EQ(err, ErrNonFiniteInput);
+    EXPECT_EQ(a.rows(), 0);
+    CxMatrixExp_head(z.handle(), &err);
+    EXPECT_EQ(err, ErrNonFiniteInput);
+}
 TEST(MatrixExponential, ChoosesTheDegreeByItsBound) {
     // The bound of each degree, from its definition with factorials.
     const auto bound = [](int q) {
@@ -166,8 +193,26 @@ TEST(MatrixSquareRoot, OfNegativeAndVanishingEigenvalues) {
     EXPECT_NEAR(a[3], 3.0, 1e-15);
     EXPECT_EQ(MatrixSqrtH(DBL2DArray(3, 3).handle(), root.handle()), WarnLowAccuracy);
     EXPECT_EQ(root.rows(), 3);
+    EXPECT_EQ(MatrixSqrtH(DBL2DArray(2, 2, {0, 1, 0, 0}).handle(), root.handle()), WarnLowAccuracy)
+        << "it has no root";
+    EXPECT_EQ(root.rows(), 2);
     EXPECT_EQ(MatrixSqrtH(DBL2DArray(0, 2).handle(), root.handle()), ErrNotSquare);
     EXPECT_EQ(MatrixSqrtH(DBL2DArray(0, 0).handle(), root.handle()), ErrEmptyInput);
+}
+
+TEST(MatrixSquareRoot, AtTheEndOfTheRange) {
+    ErrorCode err;
+    // The modulus of the eigenvalues overflows, their parts do not.
+    const double re = 1.6e308, im = 1.7e308;
+    const DBL2DArray rotation(2, 2, {re, im, -im, re}), a(2, 2, {im, re, re, im});
+    MatrixSqrt_head(rotation.handle(), &err);
+    EXPECT_EQ(err, 0);
+    const auto root = std::sqrt(std::complex<long double>(re, im));
+    EXPECT_NEAR(rotation[0] / static_cast<double>(root.real()), 1.0, 4e-15);
+    EXPECT_NEAR(rotation[1] / static_cast<double>(root.imag()), 1.0, 4e-15);
+    MatrixSqrt_head(a.handle(), &err); // an eigenvalue of 3.3e308
+    EXPECT_EQ(err, ErrNonFiniteInput);
+    EXPECT_EQ(a.rows(), 0);
 }
 
 TEST(MatrixPower, IsRepeatedMultiplication) {

@@ -151,6 +151,12 @@ TEST(Vectors, ProductsAndNorms) {
         EXPECT_EQ(vectorNormH(x.handle(), p, &value), 0);
         EXPECT_NEAR(value, expected, 1e-14) << p;
     }
+    for (const std::vector<double> &spoiled :
+         {std::vector<double>{nan, 1, 2}, {1, nan, 2}, {2, 1, nan}})
+        for (const double p : {inf, -inf, 1.0, 2.0, -3.0}) {
+            EXPECT_EQ(vectorNormH(DBLVector(spoiled).handle(), p, &value), 0);
+            EXPECT_TRUE(std::isnan(value)) << p;
+        }
     EXPECT_EQ(vectorNormH(x.handle(), nan, &value), ErrNonFiniteInput);
     EXPECT_EQ(vectorNormH(x.handle(), 0.0, &value), ErrTooFewWeights);
     EXPECT_EQ(vectorNormH(none.handle(), 2.0, &value), ErrEmptyInput);
@@ -291,6 +297,23 @@ TEST(CharacteristicPolynomial, OfKnownMatrices) {
     CxMatrixCharacteristicPoly_head(z.handle(), cx.handle(), &err);
     EXPECT_EQ(cx[0].im, -3.0);
     EXPECT_EQ(cx[1].re, 1.0);
+}
+
+TEST(CharacteristicPolynomial, RefusesCoefficientsThatOverflow) {
+    ErrorCode err;
+    const DBLVector polynomial(0);
+    const CDBVector cx(0);
+    for (const auto &[size, code] :
+         {std::pair<double, ErrorCode>(1e100, 0), {1e110, ErrOverflow}}) {
+        const DBLMatrix a(3, 3, {size, 0, 0, 0, size, 0, 0, 0, size});
+        const CDBMatrix z(3, 3, {{size, 0}, {}, {}, {}, {size, 0}, {}, {}, {}, {size, 0}});
+        MatrixCharacteristicPoly_head(a.handle(), polynomial.handle(), &err);
+        EXPECT_EQ(err, code) << size;
+        EXPECT_EQ(polynomial.size(), code == 0 ? 4 : 0);
+        CxMatrixCharacteristicPoly_head(z.handle(), cx.handle(), &err);
+        EXPECT_EQ(err, code) << size;
+        EXPECT_EQ(cx.size(), code == 0 ? 4 : 0);
+    }
 }
 
 } // namespace
