@@ -7,9 +7,9 @@ from collections.abc import Callable
 
 import numpy as np
 
-from . import outputs, recording, tables
+from . import outputs, recording
 from .calls import call
-from .tables import InputError
+from .files import InputError
 
 ITERATIONS, TOLERANCE = 2000, 1e-12
 NATURAL = 2.71828  # the exports take these digits for e
@@ -142,19 +142,25 @@ def _label(layout, column):
     return f"{name} ({unit})" if unit else name
 
 
-def read(path, x=None, y=None, weights=None, decimal=None, missing=None):
-    """Two columns of a text table, and a third one with weights. Each is a name or a number from 1; x
-    is the first column where it is not said, and y the first other one. A table of one column is
-    taken over the numbers of its rows."""
-    path = os.fspath(path)
-    if not os.path.isfile(path):
-        raise InputError(f"{path}: no such file")
-    reader = tables.Reader(path, decimal, missing)
+def read(path, x=None, y=None, weights=None, decimal=None, missing=None, time=None, dates=None,
+         thousands=False):
+    """Two columns of a table, and a third one with weights. Each is a name or a number from 1; x is the column
+    `time`, the first one where neither is said, and y the first other one. With `time` "none", and for a table
+    of one column, x is the number of the row. The others are as in recording.read."""
+    with recording.opened(path) as source:
+        options = {"decimal": decimal, "missing": missing, "dates": dates, "thousands": thousands}
+        x = x if time in (None, "none") else time
+        reader = recording.table_of(source, time, options, x, y, weights)
+        return _columns_of(reader, x, y, weights, x is None and time == "none")
+
+
+def _columns_of(reader, x, y, weights, by_rows):
+    path = reader.path
     layout = reader.layout
     chosen = {role: None if name is None else recording.column_called(path, layout, name)
               for role, name in (("x", x), ("y", y), ("w", weights))}
     free = [c for c in range(layout.width) if c not in chosen.values()]
-    for role in ("x", "y"):
+    for role in ("y",) if by_rows else ("x", "y"):
         if chosen[role] is None and (layout.width > 1 or role == "y"):
             if not free:
                 raise InputError(f"{path}: no column is left for {role}")

@@ -1,19 +1,20 @@
-"""Recordings from text tables and audio files.
+"""Recordings from text tables, sheets, arrays and audio files.
 
 A recording is read completely or not at all: whatever cannot be understood ends with an InputError of
 one line that says what is wrong and where. What was chosen, and why, is told in `choice`;
 docs/recordings.md has the rules.
 """
 
+import contextlib
 import dataclasses
 import os
 import re
 
 import numpy as np
 
-from . import audio, tables
+from . import audio, files, rates, stored, tables, times
 from .calls import call
-from .tables import InputError  # noqa: F401, for those who read recordings
+from .files import InputError  # noqa: F401, for those who read recordings
 
 WIDEST = 1e307  # with the margins of a plot still a double
 MOST_SAMPLES = 1 << 24  # that are kept of one recording
@@ -79,48 +80,28 @@ class Whole:
         return (self.squares / self.count) ** 0.5
 
 
-NUMBER = r"(\d+(?:[.,]\d+)?(?:e\d+)?)\s*(k|M)?"
-# A rate says that it is one: a plain number of hertz may be a corner or a tone.
-RATES = [re.compile(pattern, re.IGNORECASE) for pattern in (
-    rf"\b(?:fs|f_s|(?:sampl\w*|frame|abtast|scan)[ _-]*(?:rate|frequency|freq|frequenz))\W{{0,3}}"
-    rf"(?:\((?:hz|1/s|s/s)\)\W{{0,2}})?{NUMBER}",
-    rf"(?<![\d.,]){NUMBER}\s*(?:samples\s*(?:per\s+second|/\s*s(?:ec)?)|sps|s/s)(?![a-z])")]
 UNIT = re.compile(r"\[([^\]]+)\]|\(([^)]+)\)|(?:\s/\s*|/ ?)(\S+)$|"
                   r"^([munpkM]?(?:V|A|g|Pa|bar|m|W|N|K|Hz)|°C|%|dB)$")
 
 
-def rate_in(text):
-    """A sampling rate that a text names as such, or None."""
-    for pattern in RATES:
-        if match := pattern.search(text):
-            scale = {"k": 1e3, "M": 1e6}.get(match[2], 1e3 if match[2] else 1.0)
-            rate = float(match[1].replace(",", ".")) * scale
-            if rate > 0:
-                return rate
-    return None
-
-
-def read(path, rate=None, column=None, decimal=None, missing=None, start=0):
-    """Reads a text table or an audio file. `rate` overrides what the file says; `column` is a name or
-    a number from 1; `decimal` is "point" or "comma"; `missing` values are refused, or "skip" or
-    "interpolate"; `start` samples are left out."""
-    path = os.fspath(path)
-    if not os.path.exists(path):
-        raise InputError(f"{path}: no such file")
-    if os.path.isdir(path):
-        raise InputError(f"{path}: is a folder; a text table or an audio file is needed")
-    try:
-        with open(path, "rb") as file:
-            head = file.read(4096)
-        if audio.is_audio(path, head):
-            recording = _of_audio(path, column, start)
+def read(path, rate=None, column=None, decimal=None, missing=None, start=0, time=None, dates=None,
+         thousands=False):
+    """Reads a text table, a sheet, arrays or an audio file; "-" is standard input. `rate` overrides what the
+    file says, whose times are not read then; `column` and `time` are names or numbers from 1, `time` "none"
+    where no column is time; `decimal` is "point" or "comma"; `thousands` says that a single mark before three
+    digits groups thousands; `dates` is "dmy" or "mdy" for dates that may be either; `missing` values are
+    refused, or "skip" or "interpolate"; `start` samples are left out."""
+    with opened(path) as source:
+        if audio.is_audio(source.name, source.head):
+            recording = _of_audio(source, column, start)
         else:
-            recording = _of_table(path, column, decimal, missing, start)
-    except OSError as error:
-        raise InputError(f"{path}: cannot be read: {error.strerror}") from None
+            options = {"decimal": decimal, "missing": missing, "dates": dates, "thousands": thousands}
+            reader = table_of(source, time, options, column)
+            habit = rates.Habit(reader.layout.shown, {"comma": ",", "point": "."}.get(decimal, ""), thousands)
+            recording = _of_table(reader, column, time, missing, start, rate, habit)
     lowest, highest = float(recording.values.min()), float(recording.values.max())
     if highest - lowest > WIDEST:
-        raise InputError(f"{path}: from {lowest:g} to {highest:g} is more than a plot can span")
+        raise InputError(f"{source.path}: from {lowest:g} to {highest:g} is more than a plot can span")
     if rate is not None:
         recording.rate, recording.rate_source = rate, "given on the command line"
     said = (f"{recording.rate:.10g} samples per second, {recording.rate_source}" if recording.rate
@@ -130,13 +111,44 @@ def read(path, rate=None, column=None, decimal=None, missing=None, start=0):
     return recording
 
 
-def _of_audio(path, column, start):
+@contextlib.contextmanager
+def opened(path):
+    """The contents of a file (files.Source). What goes wrong with the file itself is an InputError."""
+    try:
+        with files.Source(path) as source:
+            yield source
+    except files.BROKEN as error:
+        raise InputError(f"{path}: cannot be unpacked, perhaps cut off: {error}") from None
+    except OSError as error:
+        raise InputError(f"{path}: cannot be read: {error.strerror or error}") from None
+
+
+def table_of(source, time, options, *wanted):
+    """The reader of a table: of text, of a sheet, or of arrays. `options` are those of tables.Reader, `wanted`
+    names of columns that it is to have."""
+    kind = source.kind()
+    if kind in stored.READERS:
+        reader = stored.READERS[kind](source, [*wanted, time])
+        reader.missing = options["missing"]
+    elif kind:
+        reader = stored.read_sheets(source, kind, options)
+    else:
+        reader = tables.Reader(source, **options)
+    if time not in (None, "none"):
+        reader.named_as_time = column_called(source.path, reader.layout, time)
+    return reader
+
+
+def _of_audio(source, column, start):
     whole = Whole()
-    values, rate, channel, channels, frames = audio.read(path, column, start, MOST_SAMPLES, whole)
+    path = source.local()
+    values, rate, channel, channels, frames = audio.read(source.path, path, column, start, MOST_SAMPLES, whole)
     others = f"; others: {_listed(f'channel {i + 1}' for i in range(channels) if i + 1 != channel)}"
     choice = f"channel {channel} of {channels}; {{rate}}{others * (channels > 1)}"
     choice += _part(start, len(values), frames)
-    return Recording(os.path.basename(path), values, rate or None, "from the header of the file", "FS",
+    if wrong := audio.wrong_length(path, frames):
+        choice += f"; {wrong}"
+    return Recording(source.name, values, rate or None, "from the header of the file", "FS",
                      f"channel {channel} of {channels}", [], choice, whole if whole.count else None)
 
 
@@ -153,42 +165,56 @@ def _part(start, count, all_of_them):
     return f"; without the first {start} samples" if start else ""
 
 
-def _of_table(path, column, decimal, missing, start):
-    reader = tables.Reader(path, decimal, missing)
-    layout = reader.layout
-    times, indices = _roles(reader)
-    chosen = _column(path, reader, times, indices, column)
-    time = _time_column(reader, [c for c in times if c != chosen])
-    values, seconds, whole = _columns(reader, chosen, time, start)
+def _of_table(reader, column, time, missing, start, rate, habit):
+    path, layout = reader.path, reader.layout
+    _refuse_wrapped(reader, column)
+    clocks, indices = _roles(reader, time)
+    chosen = _column(reader, clocks, indices, column)
+    time = None if rate else _time_column(reader, [c for c in clocks if c != chosen])
+    values, seconds, whole, said = _columns(reader, chosen, time, start)
     if not len(values):
         raise InputError(f"{path}: has no value from sample {start + 1} on")
-    said = []
     holes = np.isnan(values)
     if holes.any():
         values, seconds, treated = _without_holes(path, values, seconds, holes, missing)
         said.append(treated)
-    rate, source = _rate(path, reader, seconds, time)
+    source = ""
+    if not rate:
+        rate, source = _rate(reader, seconds, time, habit)
     label, unit = _label(layout, chosen, reader.notes)
+    choice = "; ".join([*_told_of_columns(reader, values, chosen, time, indices), *reader.told, *said])
+    choice += _part(start, len(values), whole.count)
+    is_part = whole.count > MOST_SAMPLES
+    return Recording(reader.name, values, rate, source, unit, label, reader.notes, choice,
+                     whole if is_part else None)
+
+
+def _refuse_wrapped(reader, column):
+    """Refuses a table whose lines hold several samples of one signal, where no column is asked for."""
+    for note in reader.notes:
+        match = rates.SEVERAL_A_LINE.search(note)
+        if match and int(match[1]) > 1 and column is None:
+            raise InputError(f"{reader.path}: has {match[0]!r}, which is not read; --column takes one column all the same")
+
+
+def _told_of_columns(reader, values, chosen, time, indices):
+    """What was taken from a table, in parts; the rate is put in later."""
+    layout = reader.layout
     choice = f"column {chosen + 1} of {layout.width}" + (f", {layout.names[chosen]}"
                                                          if layout.names[chosen] else "")
     if layout.units[chosen]:
         choice += f" ({layout.units[chosen]})"
     if layout.on_one_line:
         choice = f"{len(values)} values on one line"
-    parts = [choice]
     if layout.decimal == ",":
-        parts[0] += ", with decimal commas"
+        choice += ", with decimal commas"
+    yield choice
     if time is not None:
-        parts.append(f"time from {layout.label(time)}"
-                     + (f" ({layout.units[time]})" if layout.units[time] else ""))
-    parts.append("{rate}")
+        yield f"time from {layout.label(time)}" + (f" ({layout.units[time]})" if layout.units[time] else "")
+    yield "{rate}"
     others = [_named(layout, c, c in indices) for c in range(layout.width) if c not in (chosen, time)]
     if others:
-        parts.append(f"others: {_listed(others)}")
-    choice = "; ".join(parts + said) + _part(start, len(values), whole.count)
-    is_part = whole.count > MOST_SAMPLES
-    return Recording(os.path.basename(path), values, rate, source, unit, label, reader.notes, choice,
-                     whole if is_part else None)
+        yield f"others: {_listed(others)}"
 
 
 def _named(layout, column, is_index):
@@ -196,19 +222,25 @@ def _named(layout, column, is_index):
     return name + " (counts the rows)" * is_index
 
 
-def _roles(reader):
+def _roles(reader, time):
     """The columns that are time and those that count the rows."""
     layout = reader.layout
-    times = [c for c in range(layout.width) if reader.is_clock(c) or tables.time_unit(layout, c)[0]]
-    indices = [c for c in range(layout.width) if c not in times and tables.is_index(layout, c)]
+    if reader.named_as_time is not None:
+        found = [reader.named_as_time]
+    elif time == "none":
+        found = []
+    else:
+        found = [c for c in range(layout.width) if reader.is_clock(c) or tables.time_unit(layout, c)[0]]
+    indices = [c for c in range(layout.width) if c not in found and tables.is_index(layout, c)]
     unnamed = not any(layout.names) and layout.width > 1
-    if unnamed and not times and 0 not in indices and _rises_evenly(layout.sample(0), layout.decimal):
-        times = [0]
-    return times, indices
+    if unnamed and not found and time is None and 0 not in indices and reader.where != "the file" and _rises_evenly(
+            layout.sample(0), layout):
+        found = [0]
+    return found, indices
 
 
-def _rises_evenly(cells, decimal):
-    values = [tables.number(cell, decimal) for cell in cells]
+def _rises_evenly(cells, layout):
+    values = [layout.number(cell) for cell in cells]
     if len(values) < 3 or None in values:
         return False
     steps = np.diff(values)
@@ -228,14 +260,14 @@ def column_called(path, layout, column):
     raise InputError(f"{path}: no column {column!r} among its {layout.width}: {listed}")
 
 
-def _column(path, reader, times, indices, column):
+def _column(reader, times, indices, column):
     """The index of the column to read: the chosen one, else the first of numbers that is neither time
     nor a count of the rows."""
-    layout = reader.layout
+    layout, path = reader.layout, reader.path
     if column is not None:
         return column_called(path, layout, column)
     numeric = [c for c in range(layout.width) if not reader.is_clock(c) and any(
-        tables.number(cell, layout.decimal) is not None for cell in layout.sample(c))]
+        layout.number(cell) is not None for cell in layout.sample(c))]
     signals = [c for c in numeric if c not in times and c not in indices]
     if signals or layout.width == 1 and numeric:
         return (signals or numeric)[0]
@@ -252,9 +284,18 @@ def _time_column(reader, times):
     return ordered[0] if ordered else None
 
 
+def _date_beside(reader, time):
+    """The column of dates that goes with a column of times of day, or None."""
+    if time is None or not reader.is_clock(time) or not reader.is_of_day(time):
+        return None
+    return next((c for c in range(reader.layout.width) if c != time and reader.is_clock(c)
+                 and not reader.is_of_day(c) and not any(":" in cell for cell in reader.layout.sample(c))), None)
+
+
 def _columns(reader, chosen, time, start):
-    """The values and the times, or None, from a sample on, and the figures of all."""
-    columns = [chosen] if time is None else [chosen, time]
+    """The values and the times, or None, from a sample on, the figures of all, and what is to be said of them."""
+    date = _date_beside(reader, time)
+    columns = [c for c in dict.fromkeys((chosen, time, date)) if c is not None]
     kept, seen, whole = {c: [] for c in columns}, 0, Whole()
     for part, _ in reader.parts(columns):
         count = len(part[chosen])
@@ -264,7 +305,15 @@ def _columns(reader, chosen, time, start):
             kept[c].append(part[c][first:max(first, last)])
         whole.add(part[chosen][~np.isnan(part[chosen])])
     joined = {c: np.concatenate(parts) if parts else np.empty(0) for c, parts in kept.items()}
-    return joined[chosen], joined.get(time), whole
+    seconds, said = joined.get(time), []
+    if date is not None:
+        seconds = seconds + joined[date]
+        said = [f"dates from {reader.layout.label(date)}"]
+    elif time is not None and reader.is_clock(time) and reader.is_of_day(time):
+        seconds, nights = times.over_midnight(seconds)
+        if nights:
+            said = [f"the times go over midnight {nights} time{'s' * (nights > 1)}"]
+    return joined[chosen], seconds, whole, said
 
 
 def _without_holes(path, values, seconds, holes, missing):
@@ -280,93 +329,113 @@ def _without_holes(path, values, seconds, holes, missing):
     return values, seconds, missed + "interpolated"
 
 
-def _rate(path, reader, seconds, time):
+def _rate(reader, seconds, time, habit):
     """The sampling rate and where it comes from; without one, why."""
-    layout, reason = reader.layout, ""
+    layout, reasons, named = reader.layout, [], []
+    if reader.where == "the file":
+        habit = rates.Habit(told=".")
+    for text in [*reader.notes, *layout.names]:
+        found, remarks = rates.named_in(text, habit)
+        named += found
+        reasons += remarks
     if time is not None and len(seconds) > 1:
         scale, unit_said = _scale(reader, time, seconds)
-        rate, told = rate_of_times(seconds, scale)
-        if rate:
-            return rate, "from the time column" + unit_said + told
-        reason = f"the times {told}"
         if scale is None:
-            reason = f"the unit of the times, {tables.time_unit(layout, time)[1]}, is not known"
-    for text in [*reader.notes, *layout.names]:
-        if rate := rate_in(text):
-            return rate, "from a comment of the file" + f" ({reason})" * bool(reason)
-    stem = os.path.splitext(os.path.basename(path))[0]
+            reasons.insert(0, unit_said)
+        else:
+            rate, told = times.rate_of(seconds, scale)
+            if rate:
+                return _with_comments(rate, "from the time column", unit_said, told, named)
+            reasons.insert(0, f"the times {told}")
+    if named:
+        one = _the_named(reader.path, named)
+        source = f"from {reader.where}, '{one.words}'" + (f", taken as {one.assumed}" if one.assumed else "")
+        return one.readings[0], source + (f" ({'; '.join(reasons)})" if reasons else "")
+    stem = os.path.splitext(reader.name)[0]
     if match := re.search(r"(\d+(?:[.,]\d+)?)_?(k|M)?hz(?![a-z])", stem, re.IGNORECASE):
-        hint = f"the file's name has {match[0]}, which may be a rate or not"
-        reason = f"{reason}; {hint}" if reason else hint
-    return None, reason
+        reasons.append(f"the file's name has {match[0]}, which may be a rate or not")
+    return None, "; ".join(reasons)
 
 
-def _scale(reader, time, times):
-    """The seconds of one unit of the times, None if it is not known, and what to say of it."""
+AGREES = 0.01  # relative difference of times and what a comment says of them
+UNSAID = "which names no unit: taken as seconds"
+
+
+def _agrees(rate, named):
+    return any(abs(reading / rate - 1) <= AGREES for reading in named.readings)
+
+
+def _with_comments(rate, source, unit_said, told, named):
+    """The rate of times beside those that comments name: these settle a unit that is not said, and what disagrees
+    is told."""
+    if unit_said == UNSAID and named and not any(_agrees(rate, one) for one in named):
+        for scale, unit in ((1e-3, "milliseconds"), (1e-6, "microseconds"), (1e-9, "nanoseconds"), (60, "minutes")):
+            if agreeing := [one for one in named if _agrees(rate / scale, one)]:
+                rate, unit_said = rate / scale, f"which names no unit: taken as {unit} by '{agreeing[0].words}'"
+                told = ""  # in the other unit
+                break
+    others = [f"'{one.words}' says otherwise" for one in named if one.readings and not _agrees(rate, one)]
+    return rate, "; ".join([source + f", {unit_said}" * bool(unit_said) + told, *dict.fromkeys(others)])
+
+
+def _the_named(path, named):
+    """The one rate that a file names; refuses several, and one that may be read in two ways."""
+    for one in named:
+        if not one.readings:
+            raise InputError(f"{path}: '{one.words}' has no number that can be read: --rate says what it is")
+    sure = [one for one in named if len(one.readings) == 1]
+    for one in sure:
+        for other in named:
+            if not any(abs(reading / one.readings[0] - 1) <= 1e-3 for reading in other.readings):
+                raise InputError(f"{path}: '{one.words}' and '{other.words}' are two sampling rates: --rate says which")
+    if not sure:
+        many = " or ".join(f"{reading:.10g}" for reading in named[0].readings)
+        raise InputError(f"{path}: '{named[0].words}' may be {many} samples per second: --rate says which")
+    return sure[0]
+
+
+def _scale(reader, time, numbers):
+    """The seconds of one unit of the times, and what to say of it; None and why where it is not known."""
+    layout = reader.layout
     if reader.is_clock(time):
         return 1.0, ""
-    _, unit = tables.time_unit(reader.layout, time)
+    _, unit = tables.time_unit(layout, time, reader.named_as_time)
+    origin = reader.origins.get(time, 0)
+    first = float(numbers[0] + origin)
     if unit:
-        return tables.SECONDS.get(unit.lower()), ""
-    if not reader.layout.names[time]:
-        return 1.0, ", which has no name and is taken as seconds"
-    for least, scale, name in ((1e17, 1e-9, "nanoseconds"), (1e14, 1e-6, "microseconds"),
-                               (1e11, 1e-3, "milliseconds")):
-        if times[0] > least:
-            return scale, f", whose numbers are {name} since 1970"
-    return 1.0, ""
+        scale = rates.seconds_of(unit)
+        if scale is None:
+            return None, f"the unit of the times, {unit}, is not known"
+        is_julian = re.match(r"m?jd", layout.names[time].strip(), re.IGNORECASE)
+        return scale, "whose numbers are Julian days" if is_julian else ""
+    for scale, name in ((1e-9, "nanoseconds"), (1e-6, "microseconds"), (1e-3, "milliseconds"), (1.0, "seconds")):
+        if 3e8 < first * scale < 4.2e9:  # from 1979 to 2103
+            return scale, f"whose numbers are {name} since 1970"
+    if (20000 <= first <= 80000 or 690000 <= first <= 800000) and len(numbers) > 2:
+        return _of_days(layout.names[time], first, numbers)
+    if not layout.names[time]:
+        return 1.0, "which has no name and is taken as seconds"
+    return 1.0, UNSAID
 
 
-LEAST_ROUNDED = 8  # times, so that an even line through all of them is no accident
-
-
-def rate_of_times(times, scale=1.0):
-    """The rate of times, and in words what is uneven in them; None where they give no rate."""
-    if scale is None:
-        return None, ""
-    steps = np.diff(times)
-    if not np.isfinite(steps).all():
-        return None, "are not all there"
-    mean = (times[-1] - times[0]) / len(steps)
-    digit = _last_digit(times)
-    spread = np.abs(steps - mean).max()
-    if steps.min() >= 0 and mean > 0 and spread > 1e-6 * mean and len(times) >= LEAST_ROUNDED:
-        off_line = np.abs(times - (times[0] + mean * np.arange(len(times)))).max()
-        if off_line <= 1.01 * digit:
-            return _rounded_rate(mean * scale), (
-                f", where times are rounded to {digit * scale:.3g} s: the mean of all")
-    if steps.min() <= 0:
-        return None, f"do not rise at sample {int(np.argmax(steps <= 0)) + 2}"
-    step = float(np.median(steps))
-    if spread <= 0.01 * mean + 4e-16 * abs(times[-1]):
-        jitter = spread / mean
-        return _rounded_rate(mean * scale), (f", whose steps differ by up to {100 * jitter:.2g} %: the mean"
-                                             if jitter > 1e-4 else "")
-    usual = np.abs(steps - step) <= 0.01 * step + 1.01 * digit
-    gaps = np.flatnonzero(~usual & (steps > 1.5 * step))
-    if len(gaps) and len(gaps) <= 0.05 * len(steps) and usual.sum() + len(gaps) == len(steps):
-        step = float(steps[usual].mean())
-        longest = gaps[np.argmax(steps[gaps])]
-        return _rounded_rate(step * scale), (
-            f", where {len(gaps)} gap{'s are' if len(gaps) > 1 else ' is'} closed, the longest of "
-            f"{steps[longest] * scale:.4g} s after sample {longest + 1}: the samples are taken as even")
-    return None, (f"are uneven, steps from {steps.min() * scale:.4g} to {steps.max() * scale:.4g} s: the "
-                  "samples are taken one after the other")
-
-
-def _last_digit(times):
-    """The unit of the last decimal digit with which times are written, 0 if it is too fine."""
-    some = np.abs(times[:2000])
-    for digits in range(0, 10):
-        scaled = some * 10**digits
-        if np.abs(scaled - np.round(scaled)).max() <= 1e-6 + 1e-12 * scaled.max():
-            return 10.0**-digits
-    return 0.0
-
-
-def _rounded_rate(step):
-    rate = 1.0 / step
-    return round(rate, 3) if abs(rate - round(rate, 3)) < 1e-6 * rate else rate
+def _of_days(name, first, numbers):
+    """Whether times around 45000 are days since 1900, as spreadsheets have them, or seconds."""
+    step = (numbers[-1] - numbers[0]) / (len(numbers) - 1)
+    days = (86400.0, "whose numbers are days of a spreadsheet")
+    if re.match(r"dat|fecha", name.strip(), re.IGNORECASE):
+        return days
+    if step <= 0:
+        return 1.0, UNSAID
+    in_seconds = abs(step * 1e4 - round(step * 1e4)) < 1e-6 * step * 1e4 + 1e-6
+    length = step * 86400
+    near = round(length) if length >= 0.75 else 1 / max(1, round(1 / length))
+    in_days = abs(length / near - 1) < 0.01 and (length < 1 or any(
+        near % unit == 0 for unit in (86400, 3600, 300, 60)) or near in (1, 2, 3, 4, 5, 6, 10, 12, 15, 20, 30))
+    if in_days and not in_seconds:
+        return days
+    if in_seconds and not in_days or not in_days:
+        return 1.0, UNSAID
+    return None, f"the times from {first:.10g} may be seconds or days of a spreadsheet"
 
 
 def _label(layout, column, notes):

@@ -14,33 +14,40 @@ import re
 
 import numpy as np
 
+from .files import InputError, Source
+from .rates import seconds_of
+from .times import CLOCK, ONLY_DIGITS, SLASHED, TIME_OF_DAY, TWO_FIELDS, Format
+
 HEAD_LINES = 400
 LINES_AT_ONCE = 200_000
 COMMENTS = ("#", "%", "//")
-MISSING = {"", "-", "--", "?", "na", "n/a", "#n/a", "nan", "-nan", "null", "none", "nil", "missing"}
+# What spreadsheets write where a formula failed; it begins like a comment and is none.
+ERROR = re.compile(r"#(?:N/A|NV|NA|DIV/0!|VALUE!|VALEUR!|WERT!|REF!|BEZUG!|NAME\?|NOM\?|NUM!|NOMBRE!|ZAHL!|NULL!|NUL!)",
+                   re.IGNORECASE)
+MISSING = {"", "-", "--", "?", "na", "n/a", "nan", "-nan", "null", "none", "nil", "missing"}
 
-NUMBER = re.compile(r"[-+]?(\d+\.?\d*|\.\d+)([eE][-+]?\d+)?|[-+]?(nan|inf(inity)?)", re.IGNORECASE)
-DECIMAL_COMMA = re.compile(r"[-+]?(\d+,?\d*|,\d+)([eE][-+]?\d+)?")
-THOUSANDS = re.compile(r"[-+]?[1-9]\d{0,2}(\.\d{3})+,\d+")
-CLOCK = re.compile(r"\d{4}[-/]\d\d?[-/]\d\d?([T ]\d\d?:\d\d(:\d\d([.,]\d+)?)?)? ?(Z|[-+]\d\d:?\d\d)?"
-                   r"|\d\d?:\d\d(:\d\d([.,]\d+)?)?")
-TIME_OF_DAY = re.compile(r"\d\d?:\d\d(:\d\d([.,]\d+)?)?")
-TIME_NAME = re.compile(r"(?:rel(?:ative)?|abs(?:olute)?|elapsed|sample|sampling|system)?[ _]?"
-                       r"(?:time[ _]?stamp|date[ _]?time|time|zeit|timestamp|date|datum|uhrzeit|clock|"
-                       r"elapsed|seconds?|secs?|msecs?|millis(?:econds)?|t|s|ms)", re.IGNORECASE)
+EXPONENT = r"([eEdD][-+]?\d+)?"
+NUMBER = re.compile(rf"[-+]?(\d+\.?\d*|\.\d+){EXPONENT}|[-+]?(nan|inf(inity)?)", re.IGNORECASE)
+DECIMAL_COMMA = re.compile(rf"[-+]?(\d+,?\d*|,\d+){EXPONENT}")
+# Thousands in groups: between blanks or apostrophes, with a decimal mark or without; by commas; by points.
+SPACED = re.compile(rf"[-+]?[1-9]\d{{0,2}}(?:[ '’\u00a0\u2009\u202f]\d{{3}})+([.,]\d*)?{EXPONENT}")
+COMMA_GROUPS = re.compile(rf"[-+]?[1-9]\d{{0,2}}(,\d{{3}})+(\.\d*)?{EXPONENT}")
+POINT_GROUPS = re.compile(rf"[-+]?[1-9]\d{{0,2}}(\.\d{{3}})+(,\d*)?{EXPONENT}")
+OPEN = re.compile(r"[-+]?[1-9]\d{0,2}[.,]\d{3}")  # one group of thousands, or three decimals
+MINUS = str.maketrans({"\u2212": "-", "\u2013": "-", "\uff0d": "-"})
+UNITS_ALONE = re.compile(r"[munkMµμ]?(?:V|A|g|Pa|bar|N|W)|°C|%|dB|m/s2?|m/s²|Nm|rpm|mm|µm")
+TIME_NAME = re.compile(
+    r"(?:rel(?:ative)?|abs(?:olute)?|elapsed|sample|sampling|system|utc|gps|local|unix|epoch|mess|log|start)?[ _-]?"
+    r"(?P<stem>time[ _]?stamps?|date[ _-]?time|time|zeit(?:stempel|punkt)?|date|datum|uhrzeit|clock|elapsed|uptime|"
+    r"seconds?|secs?|msecs?|millis(?:econds)?|micros(?:econds)?|heure|horodatage|tiempo|fecha|temps|ts|epoch|unix|utc|"
+    r"m?jd|t|s|ms|us|µs)(?=$|[\s_/(\[,:.-])", re.IGNORECASE)
+WEAK_NAMES = {"temps", "ts", "epoch", "unix", "utc", "jd", "mjd", "us"}  # which mean other things, too
+NO_UNIT = {"in", "utc", "gmt", "local", "unix", "epoch", "since", "start", "from", "time", "date", "of", "day", "elapsed",
+           "relative", "absolute", "heure", "uhrzeit", "zeit", "stamp", "iso", "iso8601"}
 INDEX_NAME = re.compile(r"#|no\.?|nr\.?|n|i|id|idx|index|row|line|sample|samples|count|unnamed: 0|",
                         re.IGNORECASE)
-SECONDS = {"s": 1.0, "sec": 1.0, "secs": 1.0, "second": 1.0, "seconds": 1.0, "ms": 1e-3, "msec": 1e-3,
-           "msecs": 1e-3, "millis": 1e-3, "milliseconds": 1e-3, "us": 1e-6, "µs": 1e-6, "μs": 1e-6,
-           "usec": 1e-6, "microseconds": 1e-6, "ns": 1e-9, "nanoseconds": 1e-9, "min": 60.0,
-           "mins": 60.0, "minute": 60.0, "minutes": 60.0, "h": 3600.0, "hr": 3600.0, "hours": 3600.0,
-           "d": 86400.0, "days": 86400.0}
-KNOWN_UNIT = re.compile(r"[munpkMGµμ]?(V|A|g|Pa|bar|m|W|N|Hz|s|K|rad|T|C|F|Ohm|Ω)|°C|°F|°|deg|%|dB\w*|"
+KNOWN_UNIT = re.compile(r"[munkpMGµμ]?(V|A|g|Pa|bar|m|W|N|Hz|s|K|rad|T|C|F|Ohm|Ω)|°C|°F|°|deg|%|dB\w*|"
                         r"m/s2?|m/s\^2|m/s²|mm/s|um/s|µm/s|rpm|Nm|N m|1/min|counts?|LSB|-")
-
-
-class InputError(Exception):
-    """What is wrong with an input, with file and line."""
 
 
 @dataclasses.dataclass
@@ -53,6 +60,8 @@ class Layout:
     notes: list  # lines before the data that are no header
     body: list  # the cells of the first lines of data
     on_one_line: bool = False
+    thousands: str = ""  # the mark that groups them, beside blanks and apostrophes
+    shown: str = ""  # the decimal mark, where numbers of the head show one
 
     @property
     def width(self):
@@ -65,6 +74,9 @@ class Layout:
 
     def sample(self, column):
         return [row[column] for row in self.body]
+
+    def number(self, cell):
+        return number(cell, self.decimal, self.thousands)
 
 
 def encoding_of(path, start):
@@ -84,11 +96,29 @@ def encoding_of(path, start):
     return "utf-8-sig"
 
 
-def number(cell, decimal):
+def is_comment(text):
+    return text.startswith(COMMENTS) and not ERROR.match(text)
+
+
+def is_missing(cell):
+    return cell.lower() in MISSING or bool(ERROR.fullmatch(cell))
+
+
+def number(cell, decimal, thousands=""):
     """The number in a cell, or None. NaN and infinities are numbers here."""
+    cell = cell.translate(MINUS)
+    if thousands and (COMMA_GROUPS if thousands == "," else POINT_GROUPS).fullmatch(cell):
+        cell = cell.replace(thousands, "")
+    elif SPACED.fullmatch(cell):
+        cell = re.sub(r"[^-+\d.,a-zA-Z]", "", cell)
+    if not (DECIMAL_COMMA if decimal == "," else NUMBER).fullmatch(cell):
+        return None
     if decimal == ",":
-        return float(cell.replace(",", ".")) if DECIMAL_COMMA.fullmatch(cell) else None
-    return float(cell) if NUMBER.fullmatch(cell) else None
+        cell = cell.replace(",", ".")
+    try:
+        return float(cell)
+    except ValueError:  # Fortran's exponent
+        return float(re.sub("[dD]", "e", cell))
 
 
 def cells_of(line, separator):
@@ -102,7 +132,9 @@ def cells_of(line, separator):
 
 
 def is_value(cell):
-    return bool(NUMBER.fullmatch(cell) or DECIMAL_COMMA.fullmatch(cell) or CLOCK.fullmatch(cell))
+    cell = cell.translate(MINUS)
+    return bool(NUMBER.fullmatch(cell) or DECIMAL_COMMA.fullmatch(cell) or CLOCK.fullmatch(cell)
+                or SPACED.fullmatch(cell) or COMMA_GROUPS.fullmatch(cell) or POINT_GROUPS.fullmatch(cell))
 
 
 def _separator(lines, decimal):
@@ -114,11 +146,13 @@ def _separator(lines, decimal):
     for order, separator in enumerate((";", "\t", "|", ",", " ")):
         if found in (";", "\t", "|"):
             break  # these stand in no number
+        if separator == " " and best[0] == 1:
+            break  # blanks within dates and groups of digits
         rows = [cells_of(line, separator) for line in later]
         width, agreeing = collections.Counter(map(len, rows)).most_common(1)[0]
         if width < 2 or agreeing < 0.9 * len(rows) - 1:
             continue
-        cells = [cell for row in rows for cell in row if cell.lower() not in MISSING]
+        cells = [cell for row in rows for cell in row if not is_missing(cell)]
         share = sum(map(is_value, cells)) / max(1, len(cells))
         if share > 0 and ((share, -order) > best or found is None and (
                 share >= best[0] or separator in (";", "\t", "|"))):
@@ -126,42 +160,89 @@ def _separator(lines, decimal):
     return found
 
 
-def _commas_are_decimal(path, lines, decimal):
-    """Whether single commas in lines with nothing else between numbers belong to the numbers."""
+def _commas_belong_to_numbers(path, lines, decimal, thousands):
+    """Whether commas in lines with nothing else between numbers belong to the numbers."""
+    def is_one(line):
+        return any(kind.fullmatch(line.translate(MINUS)) for kind in (DECIMAL_COMMA, POINT_GROUPS, COMMA_GROUPS))
+
+    lines = [line.strip() for line in lines]
     later = lines[len(lines) // 2:]
-    unclear = InputError(f"{path}: {shown(later[0].strip())} may be one number with a decimal comma or two "
-                         "numbers: --decimal comma or --decimal point says which")
-    if decimal is None and all(THOUSANDS.fullmatch(line.strip()) for line in later) and not any(
-            "," in line and not THOUSANDS.fullmatch(line.strip()) for line in lines):
-        raise unclear
-    if not all(DECIMAL_COMMA.fullmatch(line.strip()) for line in later):
+    if not all(map(is_one, later)) or not any("," in line for line in later):
         return False
-    if decimal:
-        return decimal == "comma"
-    before = [line for line in lines if not DECIMAL_COMMA.fullmatch(line.strip())]
+    grouped = any(not DECIMAL_COMMA.fullmatch(line.translate(MINUS)) for line in later)
+    if grouped and thousands:
+        return True
+    if decimal and not grouped:
+        return decimal == "comma" or thousands
+    before = [line for line in lines if not is_one(line)]
     if before:
         return "," not in before[-1]
-    parts = [line.strip().split(",") for line in lines]
-    if any(len(part) == 1 or re.match("0[0-9]", part[1]) or part[0].startswith("-0") for part in parts):
-        return True
-    if len(parts) > 2 and [part[0] for part in parts] == [
-            str(int(parts[0][0] or 0) + i) for i in range(len(parts))]:
-        return False  # they count from line to line
-    raise unclear
+    parts = [line.split(",") for line in lines]
+    if not grouped:
+        if any(len(part) == 1 or re.match("0[0-9]", part[1]) or part[0].startswith("-0") for part in parts):
+            return True
+        if len(parts) > 2 and [part[0] for part in parts] == [
+                str(int(parts[0][0] or 0) + i) for i in range(len(parts))]:
+            return False  # they count from line to line
+    raise InputError(f"{path}: {shown(later[0])} may be one number with a decimal comma or two "
+                     "numbers: --decimal comma or --decimal point says which")
 
 
-def _decimal(rows, decimal):
+def _marks(path, columns, decimal, thousands):
+    """The decimal mark, the mark of thousands or an empty text, and the decimal mark that cells show."""
+    decimals, groups, in_doubt = set(), set(), {}
+    for cells in columns:
+        for cell in cells:
+            cell = cell.translate(MINUS)
+            if "." not in cell and "," not in cell or CLOCK.fullmatch(cell):
+                continue
+            if OPEN.fullmatch(cell):
+                in_doubt.setdefault("." if "." in cell else ",", []).append((cell, cells))
+            elif COMMA_GROUPS.fullmatch(cell):
+                groups.add(",")
+            elif POINT_GROUPS.fullmatch(cell):
+                groups.add(".")
+            elif "," in cell and (DECIMAL_COMMA.fullmatch(cell) or SPACED.fullmatch(cell)):
+                decimals.add(",")
+            elif "." in cell and (NUMBER.fullmatch(cell) or SPACED.fullmatch(cell)):
+                decimals.add(".")
+    other = {",": ".", ".": ","}
     if decimal:
-        return {"comma": ",", "point": "."}[decimal]
-    cells = [cell for row in rows for cell in row]
-    with_comma = any("," in cell and DECIMAL_COMMA.fullmatch(cell) for cell in cells)
-    return "," if with_comma and not any("." in cell and NUMBER.fullmatch(cell) for cell in cells) \
-        else "."
+        mark = {"comma": ",", "point": "."}[decimal]
+        return mark, other[mark], mark
+    if len(groups) == 1 and not groups & decimals:
+        decimals = {other[mark] for mark in groups}
+    if thousands and not decimals and len(in_doubt) == 1:
+        decimals = {other[mark] for mark in in_doubt}
+    if len(decimals) == 1:
+        mark = decimals.pop()
+        return mark, other[mark], mark
+    if decimals:
+        return ".", "", "."
+    for mark, cells in in_doubt.items():
+        for cell, column in cells:
+            if mark == "," or _whole_below(column):
+                raise InputError(f"{path}: {_both_readings(cell, mark)}")
+    return ".", "", "." if in_doubt else ""
+
+
+def _both_readings(cell, mark):
+    digits = cell.replace(mark, "")
+    return (f"{shown(cell)} may be {digits} or {cell.replace(mark, '.')}: --thousands or --decimal "
+            f"{'comma' if mark == ',' else 'point'} says which")
+
+
+def _whole_below(column):
+    """Whether a column holds whole numbers below a thousand and nothing else but groups of three digits: thousands
+    are written so."""
+    whole = [cell for cell in column if re.fullmatch(r"[-+]?\d{1,3}", cell)]
+    return any(cell.lstrip("+-") != "0" for cell in whole) and all(
+        OPEN.fullmatch(cell) or cell in whole for cell in column if not is_missing(cell))
 
 
 def _is_unit(cell):
     return not cell or bool(re.fullmatch(r"\[.*\]|\(.*\)", cell) or KNOWN_UNIT.fullmatch(cell)
-                            or cell.lower() in SECONDS)
+                            or seconds_of(cell) is not None)
 
 
 def _names(rows, width):
@@ -175,44 +256,41 @@ def _names(rows, width):
     return names, units, header + [row for row in rows if len(row) != width]
 
 
-def layout_of(path, lines, decimal=None):
+def layout_of(path, lines, decimal=None, thousands=False):
     """The layout of a table by its first lines, pairs of number and text without comments."""
     texts = [text for _, text in lines]
     if not texts:
         raise InputError(f"{path}: holds no numbers")
     commas_only = not any(mark in text for text in texts[len(texts) // 2:] for mark in ';\t|"')
-    if commas_only and any("," in text for text in texts) and _commas_are_decimal(path, texts, decimal):
+    if commas_only and any("," in text for text in texts) and _commas_belong_to_numbers(
+            path, texts, decimal, thousands):
         separator = None
     else:
         separator = _separator(texts, decimal)
     rows = [cells_of(text, separator) for text in texts]
     width = collections.Counter(map(len, rows[len(rows) // 2:])).most_common(1)[0][0]
-    mark = _decimal(rows, decimal)
 
     def is_data(row, columns):
-        return len(row) == width and any(number(row[c], mark) is not None or CLOCK.fullmatch(row[c])
-                                         for c in columns) and all(
-            number(row[c], mark) is not None or CLOCK.fullmatch(row[c]) or row[c].lower() in MISSING
-            for c in columns)
+        return len(row) == width and any(is_value(row[c]) for c in columns) and all(
+            is_value(row[c]) or is_missing(row[c]) for c in columns)
 
     later = [row for row in rows[len(rows) // 2:] if len(row) == width]
     valued = [c for c in range(width) if any(row[c] for row in later) and 2 * sum(
-        number(row[c], mark) is not None or bool(CLOCK.fullmatch(row[c])) for row in later)
-        >= sum(row[c].lower() not in MISSING for row in later)]
+        is_value(row[c]) for row in later) >= sum(not is_missing(row[c]) for row in later)]
     first = next((i for i, row in enumerate(rows) if is_data(row, valued)), None)
     if first is None:  # a lower half that is no data, as of one value and one word
         valued = list(range(width))
         first = next((i for i, row in enumerate(rows) if is_data(row, valued)), None)
     if first is None:
         raise InputError(f"{path}: holds no numbers")
+    body = [row for row in rows[first:] if len(row) == width]
+    mark, groups, shown_mark = _marks(path, list(zip(*body)), decimal, thousands)
     names, units, other = _names(rows[:first], width)
     found = Layout(separator, mark, lines[first][0], names, units,
-                   [" ".join(filter(None, row)) for row in other], rows[first:])
+                   [" ".join(filter(None, row)) for row in other], body, thousands=groups, shown=shown_mark)
     if len(rows) == 1 and width > 2:
         found.on_one_line = True
         found.names, found.units, found.body = [""], [""], [[cell] for cell in rows[0]]
-    else:
-        found.body = [row for row in found.body if len(row) == width]
     return found
 
 
@@ -223,49 +301,71 @@ def shown(cell):
 class Reader:
     """A table as columns of numbers, part by part."""
 
-    def __init__(self, path, decimal=None, missing=None):
-        self.path, self.missing = path, missing
-        with open(path, "rb") as file:
+    where = "a comment of the file"
+
+    def __init__(self, source, decimal=None, missing=None, dates=None, thousands=False):
+        source = source if hasattr(source, "open") else Source(source)
+        self.source, self.path, self.name, self.missing, self.dates = source, source.path, source.name, missing, dates
+        self.named_as_time = None  # the number of a column that is time whatever its name is
+        with source.open() as file:
             start = file.read(1 << 20)
         if not start:
-            raise InputError(f"{path}: the file is empty")
-        self.encoding = encoding_of(path, start)
+            raise InputError(f"{self.path}: the file is empty")
+        self.encoding = encoding_of(self.path, start)
         self.comments, head = [], []
+        self.told, self.origins, self.formats = [], {}, {}
         with self._open() as file:
             for number_, line in enumerate(file, 1):
                 text = line.strip()
-                if text.startswith(COMMENTS):
+                if is_comment(text):
                     self.comments.append(text.lstrip("#%/ ").strip())
+                    above = self.comments[-1] if not head else ""
                 elif text:
                     head.append((number_, line.rstrip("\n")))
                 if len(head) == HEAD_LINES:
                     break
-        self.layout = layout_of(path, head, decimal)
+        self.layout = layout_of(self.path, head, decimal, thousands)
+        if self.comments and not any(self.layout.names) and head[0][0] == self.layout.first:
+            self._name_by(above)
         self.notes = self.comments + self.layout.notes
 
-    def _open(self):
-        return open(self.path, encoding=self.encoding, newline=None,
-                    errors="strict" if self.encoding != "cp1252" else "replace")
+    def _name_by(self, comment):
+        """Takes the names of columns from the comment above the data, where it looks like a row of names."""
+        cells = [cell.strip('"') for cell in cells_of(comment, self.layout.separator)]
+        plain = all(re.match(r"[^\W\d_][^:=]{0,30}$", cell) for cell in cells)
+        if len(cells) == self.layout.width > 1 and plain and any(
+                TIME_NAME.match(cell) or re.search(r"[\[(]", cell) for cell in cells):
+            self.layout.names = cells
 
-    def parts(self, columns):
-        """For each part of the body a dictionary of the columns, NaN where a value is missing, and
-        the line number of each row."""
+    def _open(self):
+        return io.TextIOWrapper(self.source.open(), encoding=self.encoding, newline=None,
+                                errors="strict" if self.encoding != "cp1252" else "replace")
+
+    def _parts_of_lines(self):
+        """The line numbers and texts of the lines of data, part by part, and how they are cut."""
         if self.layout.on_one_line:
-            yield self._converted([self.layout.first] * len(self.layout.body),
-                                  [row[0] for row in self.layout.body], columns, None, 1)
+            yield [self.layout.first] * len(self.layout.body), [row[0] for row in self.layout.body], None, 1
             return
         with self._open() as file:
             lines = enumerate(file, 1)
             for number_, _ in zip(range(1, self.layout.first), lines):
                 pass
             while part := self._lines(lines):
-                yield self._converted(*part, columns, self.layout.separator, self.layout.width)
+                yield *part, self.layout.separator, self.layout.width
+
+    def parts(self, columns):
+        """For each part of the body a dictionary of the columns, NaN where a value is missing, and
+        the line number of each row."""
+        for column in filter(self.is_clock, columns):
+            self._settle(column)
+        for numbers, lines, separator, width in self._parts_of_lines():
+            yield self._converted(numbers, lines, columns, separator, width)
 
     def _lines(self, lines):
         """The numbers and texts of the next lines of data."""
         try:
             while part := list(itertools.islice(lines, LINES_AT_ONCE)):
-                numbers = [n for n, line in part if line.strip() and not line.lstrip().startswith(COMMENTS)]
+                numbers = [n for n, line in part if line.strip() and not is_comment(line.lstrip())]
                 if numbers:
                     first = part[0][0]
                     return numbers, [part[n - first][1].rstrip("\n") for n in numbers]
@@ -284,10 +384,24 @@ class Reader:
                 found = self._read(lines, column, separator, width, np.float64)
             except ValueError:
                 found = None
-            if found is None or not np.isfinite(found).all():
+            if found is None or not np.isfinite(found).all() or not self.layout.shown and (
+                    found != np.floor(found)).any():
                 found = self._examined(numbers, self._cells(lines, column, separator, width), column)
+            elif np.abs(found).max(initial=0) > 2**53:
+                found = self._of_long_numbers(found, lines, column, separator, width)
             values[column] = found
         return values, np.array(numbers)
+
+    def _of_long_numbers(self, found, lines, column, separator, width):
+        """Whole numbers beyond the digits of a double as what they exceed the first one by, for times."""
+        if not time_unit(self.layout, column, self.named_as_time)[0]:
+            return found
+        try:
+            exact = self._read(lines, column, separator, width, np.int64)
+        except (ValueError, OverflowError):
+            return found
+        origin = self.origins.setdefault(column, int(exact[0]))
+        return (exact - origin).astype(float)
 
     def _read(self, lines, column, separator, width, dtype):
         import pandas
@@ -319,14 +433,17 @@ class Reader:
     def _examined(self, numbers, cells, column):
         """The numbers of cells among which some are none."""
         values = np.empty(len(cells))
+        layout = self.layout
         for i, cell in enumerate(cells):
-            value = number(cell, self.layout.decimal)
-            place = f"{self.path}:{numbers[i]}: {self.layout.label(column)}"
-            if cell.lower() in MISSING:
+            value = layout.number(cell)
+            place = f"{self.path}:{numbers[i]}: {layout.label(column)}"
+            if is_missing(cell):
                 if self.missing is None:
                     raise InputError(f"{place}: {shown(cell)} where a value is needed; --missing skip or "
                                      "--missing interpolate reads the others")
                 value = np.nan
+            elif not layout.shown and OPEN.fullmatch(cell) and _whole_below(layout.sample(column)):
+                raise InputError(f"{place}: {_both_readings(cell, '.' if '.' in cell else ',')}")
             elif value is None:
                 raise InputError(f"{place}: {shown(cell)} is not a number")
             elif not np.isfinite(value):
@@ -335,48 +452,94 @@ class Reader:
         return values
 
     def is_clock(self, column):
-        sample = [cell for cell in self.layout.sample(column) if cell.lower() not in MISSING]
-        return bool(sample) and 2 * sum(bool(CLOCK.fullmatch(cell)) for cell in sample) > len(sample)
+        sample = [cell for cell in self.layout.sample(column) if not is_missing(cell)]
+        if bool(sample) and 2 * sum(bool(CLOCK.fullmatch(cell)) for cell in sample) > len(sample):
+            return True
+        return self._is_of_digits(column, sample)
+
+    def _is_of_digits(self, column, sample):
+        """Whether a column has dates and times as 20240131115930."""
+        if not sample or not all(map(ONLY_DIGITS.fullmatch, sample)):
+            return False
+        is_time, unit = time_unit(self.layout, column, self.named_as_time)
+        days = any(len(cell) < 12 for cell in sample)
+        return is_time and not unit and not (days and not re.search(r"dat|fecha|day|jour|tag",
+                                                                    self.layout.names[column], re.IGNORECASE))
+
+    def _settle(self, column):
+        """Chooses how the times of a column are read, by all of them where the first ones leave it open."""
+        if column in self.formats:
+            return
+        beside = any(c != column and self.is_clock(c) and not any(":" in cell for cell in self.layout.sample(c))
+                     for c in range(self.layout.width))
+        form = Format(self.dates, beside, f"{self.layout.names[column]} {self.layout.units[column]}")
+        if form.is_open(self.layout.sample(column)):
+            kept = {}  # what decides, in the order of the file
+            for numbers, lines, separator, width in self._parts_of_lines():
+                for cell in self._cells(lines, column, separator, width):
+                    match = SLASHED.match(cell) or TWO_FIELDS.fullmatch(cell)
+                    if match:
+                        kept[match[0]] = None
+            if doubt := form.settle(list(kept)):
+                raise InputError(f"{self.path}: {self.layout.label(column)}: {doubt}")
+        self.formats[column] = form
 
     def _clock(self, numbers, cells, column):
-        """Seconds of dates and times of day."""
-        import pandas
-        cells = [cell.replace(",", ".") for cell in cells]
-        if TIME_OF_DAY.fullmatch(cells[0]):
-            times = pandas.to_timedelta([cell if cell.count(":") == 2 else cell + ":00"
-                                         for cell in cells], errors="coerce")
-        else:
-            times = pandas.to_datetime(cells, utc=True, errors="coerce")
-        wrong = np.flatnonzero(times.isna())
-        if len(wrong):
-            i = wrong[0]
-            raise InputError(f"{self.path}:{numbers[i]}: {self.layout.label(column)}: "
-                             f"{shown(cells[i])} is no time like those before")
-        nanoseconds = times.asi8
-        if not hasattr(self, "start"):
-            self.start = nanoseconds[0]
-        return (nanoseconds - self.start) / 1e9
+        """Seconds of dates and times of day since the first."""
+        nanoseconds, wrong = self.formats[column].parse(cells)
+        if wrong is not None:
+            cell = cells[wrong]
+            hint = "; --time none or --rate reads the values without it"
+            raise InputError(f"{self.path}:{numbers[wrong]}: {self.layout.label(column)}: "
+                             f"{shown(cell)} is no time{' like those before' * (wrong > 0)}{hint}")
+        origin = self.origins.setdefault(column, int(nanoseconds[0]))
+        return (nanoseconds - origin) / 1e9
+
+    def is_of_day(self, column):
+        """Whether a column has times without a day."""
+        sample = [cell for cell in self.layout.sample(column) if not is_missing(cell)]
+        return bool(sample) and all(map(TIME_OF_DAY.fullmatch, sample))
 
 
-def time_unit(layout, column):
+def time_unit(layout, column, named=None):
     """Whether the name of a column says that it is time, and the unit that it or the row of units
-    says, or an empty text."""
+    says, or an empty text. `named` is the number of a column that is time whatever its name is."""
     name, unit = layout.names[column].strip(), layout.units[column]
     match = TIME_NAME.match(name)
-    rest = name[match.end():] if match else ""
-    if not match or not re.fullmatch(r"|[\s_/(\[,:.-].*", rest):
+    if named == column:
+        words = re.findall(r"[^\s_/()\[\],:.-]+", name[match.end():] if match else name)
+        found = next((word for word in reversed(words) if seconds_of(word) is not None), "")
+        return True, unit or found or ("ms" if match and match["stem"].lower() == "ms" else "")
+    if not match:
         return False, ""
-    stem = match[0].lower()
-    words = re.findall(r"[^\s_/()\[\],:.-]+", rest)
+    stem, rest = match["stem"], name[match.end():]
+    words = [word for word in re.findall(r"[^\s_/()\[\],:.-]+", rest) if word.lower() not in NO_UNIT]
     if not unit:
-        unit = next((word for word in reversed(words) if word.lower() in SECONDS), "")
+        unit = next((word for word in reversed(words) if seconds_of(word) is not None), "")
     if not unit and words and re.search(r"[(\[/]", rest):
         unit = words[-1]  # one that is not known stays one
-    if not unit and stem.rstrip("s") in ("ms", "msec", "milli", "m"):
-        unit = "ms"
-    if stem in ("t", "s", "ms") and (unit or rest) and unit.lower() not in SECONDS:
-        return False, ""  # T in degrees, or s of something
-    return True, unit
+    if not unit and seconds_of(stem) is not None and stem.lower() != "s":
+        unit = stem
+    if stem in ("T", "S", "s"):  # temperature, path and others have these letters, too
+        sure = re.search(r"[(\[/\s]", rest) or layout.units[column] or (
+            stem == "s" and layout.width > 1 and all(UNITS_ALONE.fullmatch(other) for i, other in enumerate(layout.names)
+                                                     if i != column))
+        if not sure or not (stem == "s" and not rest and not unit) and seconds_of(unit) is None:
+            return False, ""
+    elif stem.lower() in ("t", "ms") and (unit or rest) and seconds_of(unit) is None:
+        return False, ""  # t of something
+    if stem.lower() in WEAK_NAMES and not layout_rises(layout, column):
+        return False, ""
+    return True, unit or ("d" if stem.lower() in ("jd", "mjd") else "s" if stem == "s" else "")
+
+
+def layout_rises(layout, column):
+    """Whether the first values of a column are times or rise from each to the next."""
+    sample = layout.sample(column)
+    values = [layout.number(cell) for cell in sample]
+    if None in values:
+        return all(CLOCK.fullmatch(cell) for cell in sample)
+    return len(values) > 2 and all(sooner < later for sooner, later in zip(values, values[1:]))
 
 
 def is_index(layout, column):
@@ -384,6 +547,6 @@ def is_index(layout, column):
     if not INDEX_NAME.fullmatch(layout.names[column].strip()) or layout.width == 1 or (
             column > 0 and not any(layout.names)):
         return False
-    values = [number(cell, layout.decimal) for cell in layout.sample(column)]
+    values = [layout.number(cell) for cell in layout.sample(column)]
     return len(values) > 2 and all(value is not None and value == values[0] + i
                                    for i, value in enumerate(values))

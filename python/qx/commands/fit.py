@@ -3,6 +3,7 @@
 import os
 
 from ..outputs import add_force
+from . import reading
 from .values import add_command
 
 METHODS = ("squares", "absolute", "bisquare")
@@ -37,7 +38,7 @@ def fit(options):
     told = fitting.Options(METHODS.index(options.method), values(options.guess),
                            {**values(options.lower), **fixed}, {**values(options.upper), **fixed})
     columns = fitting.read(options.file, options.x, options.y, options.weights, options.decimal,
-                           options.missing)
+                           options.missing, options.time, options.dates, options.thousands)
     result = fitting.fit(model, columns, told)
     for line in fitting.lines(result):
         print(line)
@@ -61,8 +62,7 @@ def add(commands):
                        ("upper", "greatest value of a parameter"), ("fix", "value of a parameter")):
         command.add_argument(f"--{name}", metavar="NAME=NUMBER", action="append", default=[],
                              help=text + "; may be repeated")
-    command.add_argument("--decimal", choices=("point", "comma"), help="of the numbers in the table")
-    command.add_argument("--missing", choices=("skip",), help="leaves out rows with missing values")
+    reading.missing(reading.add_options(command, signal=False), "skip")
     command.add_argument("--plot", metavar="FILE", help="out/fit.svg by default; .png and .pdf, too")
     add_force(command)
     command.set_defaults(run=fit)

@@ -3,7 +3,8 @@
 import argparse
 
 from ..outputs import add_force
-from .values import add_command, positive
+from . import reading
+from .values import add_command
 
 SHOWN = 20  # lines of a table on the terminal
 PEAKS_EXAMPLES = """\
@@ -60,7 +61,8 @@ def opened(options):
     from .. import outputs, recording
     if options.csv:
         outputs.check(options.csv, options.force, inputs=outputs.identities([options.file]))
-    read = recording.read(options.file, rate=options.rate, column=options.column)
+    read = recording.read(options.file, **reading.of(options))
+    print(f"{read.name}: {read.choice}")
     step = 1 / read.rate if read.rate else 1.0
     return read, step
 
@@ -156,10 +158,9 @@ def pulse(options):
 
 def add_common(command):
     command.add_argument("file")
-    command.add_argument("--rate", type=positive, metavar="HZ", help="samples per second")
-    command.add_argument("--column", metavar="NAME", help="column or channel, a name or a number")
     command.add_argument("--csv", metavar="FILE", help="writes the table there")
     add_force(command)
+    reading.missing(reading.add_options(command), "skip", "interpolate")
 
 
 def add(commands):

@@ -5,7 +5,8 @@ import os
 import sys
 
 from ..outputs import add_force
-from .values import add_command, positive
+from . import reading as reading_options
+from .values import add_command
 
 EXAMPLES = """\
 examples:
@@ -19,8 +20,7 @@ Pages of an earlier report in the folder are replaced; other files of their name
 
 def report_on(options):
     from .. import many
-    reading = {"rate": options.rate, "column": options.column, "decimal": options.decimal,
-               "missing": options.missing, "start": options.start}
+    reading = reading_options.of(options)
     if many.is_many(options.files):
         return report_on_many(options, reading)
     from .. import outputs, recording, report
@@ -69,13 +69,7 @@ def add(commands):
                           description="Analyses a recording, or many: each has a page then, and "
                           "an index leads to them.")
     command.add_argument("files", nargs="+", metavar="FILE|FOLDER|PATTERN")
-    command.add_argument("--rate", type=positive, metavar="HZ", help="samples per second")
-    command.add_argument("--column", metavar="NAME", help="column or channel, a name or a number")
-    command.add_argument("--decimal", choices=("point", "comma"), help="of the numbers in a table")
-    command.add_argument("--missing", choices=("skip", "interpolate"),
-                         help="what becomes of missing values, which are refused otherwise")
-    command.add_argument("--start", type=int, default=0, metavar="SAMPLES",
-                         help="samples to leave out at the start")
+    reading_options.missing(reading_options.add_options(command), "skip", "interpolate")
     command.add_argument("--output", default="out", metavar="FOLDER",
                          help="where the pages go, out by default")
     command.add_argument("--workers", type=count, metavar="N",

@@ -1,0 +1,267 @@
+"""Dates and times of day as texts have them, and the sampling rate of a column of times.
+
+Texts become nanoseconds since 1970, or since midnight where there is no date. What order day and month have,
+and whether two fields are minutes and seconds, is decided by all texts of a column (Format.settle)."""
+
+import datetime
+import functools
+import re
+
+import numpy as np
+
+ZONE = r"(?:\s?(?:Z|UTC|GMT|Uhr)|\s?[+-]\d\d:?\d\d)?"
+AMPM = r"(?:\s?[AaPp]\.?[Mm]\.?)?"
+FRACTION = r"(?:[.,]\d+)?"
+ISO_DAY = r"\d{4}-\d\d?-\d\d?|\d{4}/\d\d?/\d\d?|\d{4}\.\d\d?\.\d\d?"
+DOTTED_DAY = r"\d\d?\.\s?\d\d?\.\s?(?:\d{4}|\d\d)"
+SLASHED_DAY = r"\d\d?/\d\d?/(?:\d{4}|\d\d)|\d\d?-\d\d?-\d{4}"
+NAMED_DAY = r"\d\d?(?:\.\s?|[\s-])[^\W\d_]{3,9}\.?[\s-](?:\d{4}|\d\d)|[^\W\d_]{3,9}\.?\s\d\d?,?\s\d{4}"
+DAY = rf"(?:{ISO_DAY}|{DOTTED_DAY}|{SLASHED_DAY}|{NAMED_DAY})"
+OF_DAY = rf"\d\d?:\d\d(?::\d\d{FRACTION})?{AMPM}"
+MINUTES = r"\d+:\d\d[.,]\d+"  # and seconds with decimals
+COMPACT = rf"\d{{8}}T\d{{4}}(?:\d\d{FRACTION})?"
+CLOCK = re.compile(rf"{DAY}(?:(?:T|,?\s+){OF_DAY}{ZONE})?|{OF_DAY}{ZONE}|{MINUTES}|{COMPACT}{ZONE}")
+ONLY_DIGITS = re.compile(r"(?:19|20)\d\d(?:0[1-9]|1[0-2])(?:0[1-9]|[12]\d|3[01])"
+                         rf"(?:[ ]?(?:[01]\d|2[0-3])[0-5]\d(?:[0-5]\d{FRACTION})?)?")
+TIME_OF_DAY = re.compile(rf"{OF_DAY}{ZONE}|{MINUTES}")
+TWO_FIELDS = re.compile(r"(\d+):(\d\d)")
+SLASHED = re.compile(r"(\d\d?)[/-](\d\d?)[/-](\d{4}|\d\d)(?!\d)")
+ISO = re.compile(rf"\d{{4}}-\d\d-\d\d(?:[T ]\d\d:\d\d:\d\d(?:[.,]\d+)?(?:Z|[+-]\d\d:?\d\d)?)?")
+
+MONTHS = {name: number for number, names in enumerate((
+    "jan january januar janv janvier jän jänner ene", "feb february februar févr fév février fevr",
+    "mar march märz mär mrz mars maerz", "apr april avr avril abr", "may mai mayo", "jun june juni juin",
+    "jul july juli juil juillet", "aug august août aout ago", "sep sept september septembre",
+    "oct october okt oktober octobre", "nov november novembre", "dec december dez dezember déc décembre dic"), 1)
+    for name in names.split()}
+DAY_NS = 86400 * 10**9
+
+PARTS = re.compile(
+    rf"(?:(?P<day>{DAY})|(?P<compact>\d{{8}}))?(?:T|,?\s+)?"
+    r"(?:(?P<h>\d+):(?P<m>\d\d)(?::(?P<s>\d\d))?(?:[.,](?P<f>\d+))?|"
+    r"(?P<hc>\d\d)(?P<mc>\d\d)(?:(?P<sc>\d\d)(?:[.,](?P<fc>\d+))?)?)?"
+    r"\s?(?P<half>[AaPp](?=\.?[Mm]\.?))?(?:\.?[Mm]\.?)?\s?(?:Z|UTC|GMT|Uhr|(?P<zone>[+-]\d\d:?\d\d))?")
+
+
+@functools.lru_cache(maxsize=4096)
+def _days(text, order):
+    """The days since 1970 of a date; ValueError where it is none."""
+    if match := re.fullmatch(r"(\d{4})[-/.]?(\d\d?)[-/.]?(\d\d?)", text):
+        year, month, day = map(int, match.groups())
+    elif match := re.fullmatch(r"(\d\d?)\.\s?(\d\d?)\.\s?(\d+)", text):
+        day, month, year = map(int, match.groups())
+    elif match := SLASHED.fullmatch(text):
+        first, second, year = map(int, match.groups())
+        day, month = (first, second) if order == "dmy" else (second, first)
+    else:
+        words = re.findall(r"[^\W\d_]+|\d+", text)
+        month = next((MONTHS[word.lower()] for word in words if word.lower() in MONTHS), 0)
+        day, year = (int(word) for word in words if word.isdigit())
+    if year < 100:
+        year += 2000 if year < 70 else 1900
+    return datetime.date(year, month, day).toordinal() - 719163
+
+
+def _nanoseconds(fraction):
+    return int((fraction or "0")[:9].ljust(9, "0"))
+
+
+class Format:
+    """How the times of one column are written."""
+
+    def __init__(self, order=None, beside_date=False, name=""):
+        self.order = order  # "dmy", "mdy" or None, which settle() may change
+        self.fields = ""  # of clocks with two of them: "m" where they are minutes and seconds
+        if re.search(r"m+:s+", name, re.IGNORECASE) and not re.search(r"h+:m+", name, re.IGNORECASE):
+            self.fields = "m"
+        elif beside_date or re.search(r"h+:m+|uhr|clock|heure|time of day|utc|local", name, re.IGNORECASE):
+            self.fields = "h"
+
+    def is_open(self, cells):
+        """Whether cells are among those that only the whole column explains."""
+        return (any(TWO_FIELDS.fullmatch(cell) for cell in cells) and not self.fields
+                or any(SLASHED.match(cell) for cell in cells) and not self.order)
+
+    def settle(self, cells):
+        """Decides on the order of days and months, and on clocks with two fields, by all texts of a column.
+        Gives what is in doubt in words, or an empty text."""
+        dates = {match.groups(): match[0] for cell in cells if (match := SLASHED.match(cell))}
+        if dates and not self.order:
+            self.order = ("dmy" if any(int(first) > 12 for first, _, _ in dates) else
+                          "mdy" if any(int(second) > 12 for _, second, _ in dates) else self._rising(dates))
+            if not self.order:
+                text = next(iter(dates.values()))
+                day, month = SLASHED.match(text)[1], SLASHED.match(text)[2]
+                names = "January February March April May June July August September October November December"
+                return (f"'{text}' may be {int(day)} {names.split()[int(month) - 1]} or "
+                        f"{names.split()[int(day) - 1]} {int(month)}: --dates dmy or --dates mdy says which")
+        clocks = [match for cell in cells if (match := TWO_FIELDS.fullmatch(cell))]
+        if clocks and not self.fields:
+            hours = [int(match[1]) for match in clocks]
+            if max(hours) > 23:
+                self.fields = "m"
+            elif any(later < sooner for sooner, later in zip(hours, hours[1:])):
+                self.fields = "h"  # over midnight
+            else:
+                return (f"'{clocks[0][0]}' may be minutes and seconds or hours and minutes: mm:ss or hh:mm in the "
+                        "name of the column says which; --time none or --rate reads the values without it")
+        return ""
+
+    @staticmethod
+    def _rising(dates):
+        """The only order in which dates do not fall, any for one date, None where both are possible."""
+        if len(dates) == 1:
+            return "dmy"
+        rising = []
+        for order in ("dmy", "mdy"):
+            days = [_days(text, order) for text in dates.values()]
+            if all(sooner < later for sooner, later in zip(days, days[1:])):
+                rising.append(order)
+        return rising[0] if len(rising) == 1 else None
+
+    def nanoseconds(self, cell):
+        """Since 1970 or since midnight, and None where the cell is no time."""
+        match = PARTS.fullmatch(cell.strip())
+        if not match or not cell.strip():
+            return None
+        part = match.groupdict()
+        day = part["day"] or part["compact"]
+        try:
+            total = _days(day, self.order) * DAY_NS if day else 0
+        except ValueError:
+            return None
+        if part["h"] is None and part["hc"] is None:
+            return total if day else None
+        hours, minutes = int(part["h"] or part["hc"]), int(part["m"] or part["mc"])
+        seconds, fraction = int(part["s"] or part["sc"] or 0), part["f"] or part["fc"]
+        if part["h"] and part["s"] is None and not day and (fraction or self.fields == "m"):
+            hours, minutes, seconds = 0, hours, minutes  # minutes of any number
+        elif minutes > 59 or day and hours > 24:
+            return None
+        if part["half"]:
+            if not 1 <= hours <= 12:
+                return None
+            hours = hours % 12 + 12 * (part["half"] in "pP")
+        if seconds > 60:
+            return None
+        total += (3600 * hours + 60 * minutes + seconds) * 10**9 + _nanoseconds(fraction)
+        if zone := part["zone"]:
+            shift = (int(zone[1:3]) * 60 + int(zone[-2:])) * 60 * 10**9
+            total += -shift if zone[0] == "+" else shift
+        return total
+
+    def parse(self, cells):
+        """The nanoseconds of cells, and the index of the first that is no time or None."""
+        if ISO.fullmatch(cells[0]):
+            import pandas
+            times = pandas.to_datetime([cell.replace(",", ".") if ISO.fullmatch(cell) else "" for cell in cells],
+                                       utc=True, errors="coerce")
+            wrong = np.flatnonzero(times.isna())
+            if not len(wrong):
+                return times.asi8, None
+        found = [self.nanoseconds(cell) for cell in cells]
+        if None in found:
+            return np.empty(0, np.int64), found.index(None)
+        return np.array(found, np.int64), None
+
+
+def over_midnight(seconds):
+    """Times of day with a day added wherever they fall back by most of one, and how often they do."""
+    falls = np.flatnonzero(np.diff(seconds) < -43200)
+    if len(falls):
+        seconds = seconds.copy()
+        for fall in falls:
+            seconds[fall + 1:] += 86400
+    return seconds, len(falls)
+
+
+# The rate of times
+
+LEAST_ROUNDED = 8  # times, so that an even line through all of them is no accident
+
+
+def rate_of(times, scale=1.0):
+    """The rate of times, and in words what is uneven in them; None where they give no rate."""
+    steps = np.diff(times)
+    if not np.isfinite(steps).all():
+        return None, "are not all there"
+    mean = (times[-1] - times[0]) / len(steps)
+    spread = np.abs(steps - mean).max()
+    digit = last_digit(times)
+    if mean > 0 and steps.min() >= 0 and spread > 1e-6 * mean:
+        gaps, whole = _gaps(steps, digit)
+        if not len(gaps) and len(times) >= LEAST_ROUNDED:
+            step, off, doubt = _line(times)
+            if np.ptp(off) <= 1.1 * digit:
+                return _with_doubt(step * scale, doubt / step, f", where times are rounded to {digit * scale:.3g} s")
+    if steps.min() <= 0:
+        return None, f"do not rise at sample {int(np.argmax(steps <= 0)) + 2}"
+    if spread <= 0.01 * mean + 4e-16 * abs(times[-1]):
+        step, _, doubt = _line(times)
+        jitter = spread / mean
+        said = f", whose steps differ by up to {100 * jitter:.2g} %" if jitter > 1e-4 else ""
+        return _with_doubt(step * scale, doubt / step if said else 0.0, said)
+    if len(gaps) and whole:
+        closed = np.delete(steps, gaps)
+        step, _, doubt = _line(np.concatenate([[0.0], np.cumsum(closed)]))
+        longest = gaps[np.argmax(steps[gaps])]
+        return rounded(1 / (step * scale), doubt / step), (
+            f", where {len(gaps)} gap{'s are' if len(gaps) > 1 else ' is'} closed, the longest of "
+            f"{steps[longest] * scale:.4g} s after sample {longest + 1}: the samples are taken as even")
+    return None, (f"are uneven, steps from {steps.min() * scale:.4g} to {steps.max() * scale:.4g} s: the "
+                  "samples are taken one after the other")
+
+
+def _line(times):
+    """The slope of the line by least squares through all times over their numbers, what is off it, and twice
+    the standard deviation of the slope."""
+    n = len(times)
+    places = np.arange(n) - (n - 1) / 2
+    off = times - times[0]
+    mean = off.mean()
+    power = n * (n * n - 1.0) / 12
+    step = float(places @ (off - mean)) / power
+    off = off - mean - step * places
+    return step, off, 2 * float(np.sqrt(np.mean(off * off) / power))
+
+
+def _gaps(steps, digit):
+    """The places of long steps among equal ones, and whether all others are equal. Rounding makes long steps,
+    too: at even distances."""
+    step = float(np.median(steps))
+    usual = np.abs(steps - step) <= 0.01 * step + (1.01 * digit if digit < 0.5 * step else 0.0)
+    gaps = np.flatnonzero(~usual & (steps > 1.5 * step))
+    none = np.zeros(0, int)
+    if not len(gaps) or len(gaps) > 0.05 * len(steps) or usual.sum() + len(gaps) < len(steps):
+        return none, False
+    distances = np.diff(gaps)
+    even = len(gaps) > 2 and np.ptp(distances) <= 1 and np.ptp(steps[gaps]) <= 0.01 * step
+    return (none, False) if even and steps[gaps].max() <= step + 1.01 * digit else (gaps, True)
+
+
+def _with_doubt(step, doubt, said):
+    """The rate of a step, and what is said of it: the line through all times has a standard deviation."""
+    rate = rounded(1 / step, doubt)
+    if said:
+        said += f": a line through all of them, {1 / step:.8g} ± {doubt / step:.1g}"
+    return rate, said
+
+
+def rounded(rate, doubt):
+    """The number of the fewest decimal digits that a rate may be, within a relative doubt."""
+    width = max(doubt, 1e-9) * rate
+    for digits in range(-9, 10):
+        near = round(rate, digits)
+        if near > 0 and abs(near - rate) <= width and width < 0.01 * rate:
+            return float(near)
+    return rate
+
+
+def last_digit(times):
+    """The unit of the last decimal digit with which times are written, 0 if it is too fine."""
+    some = np.abs(times[:2000])
+    for digits in range(0, 10):
+        scaled = some * 10**digits
+        if np.abs(scaled - np.round(scaled)).max() <= 1e-6 + 1e-12 * scaled.max():
+            return 10.0**-digits
+    return 0.0
