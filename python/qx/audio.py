@@ -29,10 +29,7 @@ def read(path, local, column, first, most, whole):
             if column is not None and not (str(column).isdigit() and 1 <= int(column) <= channels):
                 raise InputError(f"{path}: no channel {column!r} among its {channels}")
             channel = int(column or 1)
-            if frames == 0:
-                wrong = wrong_length(local, frames)
-                raise InputError(f"{path}: the file holds no samples" + f": {wrong}" * bool(wrong))
-            if not 0 <= first < frames:
+            if frames and not 0 <= first < frames:
                 raise InputError(f"{path}: has {frames} samples, none at {first}")
             values, frames = _channel(path, file, channel, first, most, whole)
             rate = float(file.samplerate)
@@ -40,7 +37,8 @@ def read(path, local, column, first, most, whole):
         reason = error.error_string.strip().rstrip(".")
         raise InputError(f"{path}: cannot be read as audio: {reason}") from None
     if not len(values):
-        raise InputError(f"{path}: the file holds no samples")
+        wrong = wrong_length(local, 0)
+        raise InputError(f"{path}: the file holds no samples" + f": {wrong}" * bool(wrong))
     return values, rate, channel, channels, frames
 
 
@@ -59,44 +57,64 @@ def _channel(path, file, channel, first, most, whole):
     return np.concatenate(kept) if kept else np.empty(0), seen
 
 
-UNKNOWN = (0xFFFFFFFF, 0x7FFFFFFF, 0x7FFFFFFF + 1)  # what recorders write that cannot go back to the header
-
-
 def wrong_length(local, frames):
     """What is wrong with the lengths that a file announces, or an empty text. `frames` is how many could be
     read."""
     size = os.path.getsize(local)
     with open(local, "rb") as file:
-        start = file.read(12)
-        if start[:4] in (b"RIFF", b"RIFX", b"FORM"):
-            return _wrong_chunks(file, start, size, frames)
+        start = file.read(24)
+        if start[:4] == b"OggS":
+            file.seek(max(0, size - (1 << 17)))
+            end = file.read()
+            last = end.rfind(b"OggS")
+            return "" if last >= 0 and end[last + 5] & 4 else "the file is cut off: its last page is missing"
+        if start[:4] == b".snd":
+            data, length = struct.unpack(">II", start[4:12])
+            return _cut(length, size - data) if length != OPEN else LEFT_OPEN
+        if chunks := CHUNKS.get(start[:4]):
+            return _wrong_chunks(file, start, size, frames, *chunks)
     import soundfile
     with soundfile.SoundFile(local) as file:
-        announced = file.frames
-    return f"the file is cut off: {frames} of {announced} samples are there" if frames < announced else ""
+        return _cut(file.frames, frames, "samples")
 
 
-def _wrong_chunks(file, start, size, frames):
-    """As wrong_length, of a file of chunks: each a name, a length and that many bytes."""
-    order = "<" if start[:4] == b"RIFF" else ">"
-    samples, at, announced = ((b"data",), 12, None) if start[:4] != b"FORM" else ((b"SSND",), 12, None)
-    while at + 8 <= size:
+OPEN = 0xFFFFFFFF  # what recorders write that cannot go back to the header
+LEFT_OPEN = "the header leaves the length open: all to the end of the file is taken"
+# By the first bytes: the struct of name and length of a chunk, where the first one begins, the name of the samples,
+# to how many bytes chunks are filled, and what of its own head a length counts.
+CHUNKS = {b"RIFF": ("<4sI", 12, b"data", 2, 0), b"RIFX": (">4sI", 12, b"data", 2, 0),
+          b"RF64": ("<4sI", 12, b"data", 2, 0), b"FORM": (">4sI", 12, b"SSND", 2, 0),
+          b"caff": (">4sq", 8, b"data", 1, 0), b"riff": ("<4s12xQ", 40, b"data", 8, 24)}
+
+
+def _cut(announced, there, what="bytes of samples"):
+    return f"the file is cut off: {there} of {announced} {what} are there" if there < announced else ""
+
+
+def _wrong_chunks(file, start, size, frames, head, at, samples, filled, counted):
+    announced, long, width = None, None, struct.calcsize(head)
+    while at + width <= size:
         file.seek(at)
-        name, length = struct.unpack(f"{order}4sI", file.read(8))
+        name, length = struct.unpack(head, file.read(width))
+        length -= counted
         if name == b"COMM":
             announced = struct.unpack(">hI", file.read(6))[1]
-        rest = size - at - 8
-        if name in samples:
-            if length in UNKNOWN:
-                return "the header leaves the length open: all to the end of the file is taken"
+        elif name == b"ds64":
+            long = struct.unpack("<QQ", file.read(16))[1]
+        rest = size - at - width
+        if name == samples:
+            length = long if length == OPEN and long is not None else length
+            if length in (OPEN, -1):
+                return LEFT_OPEN
             if length > rest:
-                return f"the file is cut off: {rest} of {length} bytes of samples are there"
+                return _cut(length, rest)
             if announced is not None and announced != frames:
                 return f"the header announces {announced} samples, {frames} are there"
-        elif length > rest or not re.fullmatch(rb"[\x20-\x7e]{4}", name):
-            return f"{rest + 8} bytes at the end of the file belong to no part of it: the header may be wrong"
-        at += 8 + length + length % 2
-    named = struct.unpack(f"{order}I", start[4:8])[0] + 8
-    if named not in (size, size - 1, size + 1, 8) and named - 8 not in UNKNOWN:
-        return f"the header announces a file of {named} bytes, which has {size}"
+        elif not 0 <= length <= rest or not re.fullmatch(rb"[\x20-\x7e]{4}", name):
+            return f"{rest + width} bytes at the end of the file belong to no part of it: the header may be wrong"
+        at += width + -(-length // filled) * filled
+    if start[:4] in (b"RIFF", b"RIFX", b"FORM"):
+        named = struct.unpack(head[0] + "I", start[4:8])[0] + 8
+        if abs(named - size) > 1 and named not in (8, OPEN + 8):
+            return f"the header announces a file of {named} bytes, which has {size}"
     return ""

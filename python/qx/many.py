@@ -15,7 +15,8 @@ from pathlib import Path
 
 from . import outputs
 from .audio import ENDINGS as AUDIO
-from .tables import InputError
+from .files import COMPRESSED, InputError
+from .stored import ENDINGS as STORED
 
 TABLES = (".csv", ".txt", ".tsv", ".tab", ".dat", ".asc", ".prn")
 MAIN = ("Mean", "Root mean square", "Standard deviation", "Strongest above 0 at")
@@ -39,13 +40,26 @@ def is_pattern(path):
     return not os.path.exists(path) and glob.has_magic(path)
 
 
+def is_recording(path):
+    """Whether a file of a folder has the ending of a recording, compressed or not."""
+    endings = [ending.lower() for ending in path.suffixes[-2:]]
+    if endings and endings[-1] in COMPRESSED:
+        return endings[-1] == ".zip" or len(endings) > 1 and endings[0] in (*TABLES, *AUDIO, *STORED)
+    return bool(endings) and endings[-1] in (*TABLES, *AUDIO, *STORED)
+
+
+def left_out(paths):
+    """The files of folders that are not read, without the hidden ones."""
+    return sorted(str(path) for given in paths if os.path.isdir(given) for path in Path(given).rglob("*")
+                  if path.is_file() and not path.name.startswith(".") and not is_recording(path))
+
+
 def files_of(paths):
     """Pairs of a name and a path: what folders hold, patterns match, or is named itself."""
     found = {}
     for given in paths:
         if os.path.isdir(given):
-            inside = [path for path in Path(given).rglob("*") if path.is_file()
-                      and path.suffix.lower() in (*TABLES, *AUDIO)]
+            inside = [path for path in Path(given).rglob("*") if path.is_file() and is_recording(path)]
             found |= {str(path): path.relative_to(given) for path in inside}
         elif is_pattern(given):
             found |= {path: Path(path) for path in glob.glob(given, recursive=True) if os.path.isfile(path)}
@@ -143,7 +157,7 @@ def _finished(executor, pairs, options, left):
             left.append(pair)
 
 
-def index(found):
+def index(found, left=()):
     """The page that leads to the others."""
     from .report import HEAD, STYLE
     escape = html.escape
@@ -153,13 +167,15 @@ def index(found):
         + "".join(f'<td class="value">{escape(cell)}</td>' for cell in outcome.cells) + "</tr>\n"
         for outcome in found if not outcome.failure)
     failed = "".join(f"<li>{escape(outcome.failure)}</li>\n" for outcome in found if outcome.failure)
+    others = "".join(f"<li>{escape(path)}</li>\n" for path in left)
     read = sum(not outcome.failure for outcome in found)
     return (f'<!DOCTYPE html>\n<html lang="en"><head>{HEAD}{outputs.generator("report")}'
             f"<title>Recordings</title><style>{STYLE}"
             "div.wide { overflow-x: auto; }</style></head><body><h1>Recordings</h1>"
             f"<p>{read} of {len(found)} recordings were read.</p>"
             f'<div class="wide"><table><tr>{header}</tr>\n{rows}</table></div>'
-            + (f"<h2>Not read</h2><ul>{failed}</ul>" if failed else "") + "</body></html>\n")
+            + (f"<h2>Not read</h2><ul>{failed}</ul>" if failed else "")
+            + (f"<h2>Left out by their endings</h2><ul>{others}</ul>" if others else "") + "</body></html>\n")
 
 
 def _link(name):
@@ -193,5 +209,5 @@ def write(paths, folder, options, workers=None, scheduler=None, tell=lambda outc
         tell(outcome)
     order = {name: i for i, (name, _) in enumerate(pairs)}
     found.sort(key=lambda outcome: order[outcome.name])
-    outputs.write_text(os.path.join(folder, "index.html"), index(found))
+    outputs.write_text(os.path.join(folder, "index.html"), index(found, left_out(paths)))
     return found

@@ -248,12 +248,12 @@ def _with_doubt(step, doubt, said):
 
 
 def rounded(rate, doubt):
-    """The number of the fewest decimal digits that a rate may be, within a relative doubt."""
+    """The number of the fewest digits, up to seven, that a rate may be within a relative doubt."""
     width = max(doubt, 1e-9) * rate
-    for digits in range(-9, 10):
-        near = round(rate, digits)
-        if near > 0 and abs(near - rate) <= width and width < 0.01 * rate:
-            return float(near)
+    for digits in range(1, 8):
+        near = float(f"{rate:.{digits - 1}e}")
+        if abs(near - rate) <= width:
+            return near
     return rate
 
 

@@ -157,7 +157,7 @@ def pulse(options):
 
 
 def add_common(command):
-    command.add_argument("file")
+    command.add_argument("file", help="- is standard input")
     command.add_argument("--csv", metavar="FILE", help="writes the table there")
     add_force(command)
     reading.missing(reading.add_options(command), "skip", "interpolate")

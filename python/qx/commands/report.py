@@ -18,6 +18,9 @@ examples:
 Pages of an earlier report in the folder are replaced; other files of their names only with --force."""
 
 
+LISTED = 10  # files on the terminal
+
+
 def report_on(options):
     from .. import many
     reading = reading_options.of(options)
@@ -52,6 +55,9 @@ def report_on_many(options, reading):
         bar.close()
     read = sum(not outcome.failure for outcome in found)
     print(f"{read} of {len(found)} recordings were read: {os.path.join(options.output, 'index.html')}")
+    if left := many.left_out(options.files):
+        print(f"left out by their endings: {', '.join(left[:LISTED])}"
+              + f" and {len(left) - LISTED} more, which the index lists" * (len(left) > LISTED))
     if not read:
         raise many.InputError("no recording could be read")
 
@@ -68,7 +74,7 @@ def add(commands):
                           help="analyses recordings, text tables or audio files",
                           description="Analyses a recording, or many: each has a page then, and "
                           "an index leads to them.")
-    command.add_argument("files", nargs="+", metavar="FILE|FOLDER|PATTERN")
+    command.add_argument("files", nargs="+", metavar="FILE|FOLDER|PATTERN", help="- is standard input")
     reading_options.missing(reading_options.add_options(command), "skip", "interpolate")
     command.add_argument("--output", default="out", metavar="FOLDER",
                          help="where the pages go, out by default")
