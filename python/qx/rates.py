@@ -29,7 +29,7 @@ NUMBER = (rf"(?:\d{{1,3}}(?:[{BLANKS}]\d{{3}})+(?!\d)(?:[.,]\d+)?|\d+(?:[.,'’]
           r"(?:[eE][-+]?\d+|\s?[x×*·]\s?10\^?[-+]?\d+)?(?![\d'’])")
 TIME = "(?:" + "|".join(sorted(map(re.escape, SECONDS), key=len, reverse=True)) + r")\b\.?"
 SAMPLES = (r"(?:samples?|smpl?s?|points?|pts|scans?|readings?|measurements?|values?|(?:mess|abtast)?werte|"
-           r"abtastungen|messungen|[ée]chantillons?|[ée]ch\.?|mesures?|points? de mesure|muestras|campioni)")
+           r"abtastungen|messungen|times|[ée]chantillons?|[ée]ch\.?|mesures?|points? de mesure|muestras|campioni)")
 PER = r"\s*(?:/|\bper\b|\bpro\b|\bpar\b|\bpor\b|\bal\b|\bje\b)\s*"
 COUNTED = (rf"(?P<kilo>[kKMG]?)(?:S|Sa|SA)/(?P<t1>(?i:{TIME}))|(?P<sps>[kKMGm]?)(?:sps|SPS|Sps|fps|FPS)\b|"
            rf"(?i:{SAMPLES}{PER}(?P<t2>{TIME}))")
@@ -42,9 +42,9 @@ END = r"(?![\w^*²³⁻°%]|\s*/\s*[A-Za-z])"
 STRONG_RATE = (r"sampl(?:e|es|ing|er)?[ _-]*(?:rate|frequency|freq\b\.?|frequenz)|abtast[ -]*(?:rate|frequenz)|"
                r"(?:fr[ée]quence|taux|cadence|fr[ée]q\.?)\s+d(?:['’]|e\s+)\s*(?:[ée]chantillonnage|acquisition)|"
                r"frecuencia de muestreo|frequenza di campionamento|acquisition[ _-]*(?:rate|frequency)|"
-               r"sampled at|digiti[sz]ed at|abgetastet mit|[ée]chantillonn[ée]e? [àa]|(?-i:[fF]_?s)")
+               r"(?:sampled|sampling) (?:at|with)|digiti[sz]ed at|abgetastet mit|(?-i:sfreq|srate|sps|SPS)|[ée]chantillonn[ée]e? [àa]|(?-i:[fF]_?s)")
 WEAK_RATE = (r"(?:scan|frame|data|log(?:ging)?|recording|measur(?:ement|ing))[ _-]*(?:rate|frequency)|"
-             r"(?:mess|aufzeichnungs|log)(?:rate|frequenz)|acquired at|recorded at|aufgezeichnet mit|(?-i:Fe|FS)")
+             r"(?:mess|aufzeichnungs|log)(?:rate|frequenz)|acquired at|recorded at|aufgezeichnet mit|sampling|abtastung|[ée]chantillonnage|(?-i:Fe|FS|sr|SR|ODR)")
 STRONG_INTERVAL = (
     r"(?:sampl(?:e|es|ing)|scan|log(?:ging)?|recording|measur(?:ement|ing)|acquisition)[ _-]*(?:interval|period)|"
     r"time[ _-]*(?:step|increment)|x[ _-]?incr(?:ement)?|delta[ _-]?t|(?-i:[Δ∆]t|dt|DT)|"
@@ -57,14 +57,19 @@ CONTINENTAL = re.compile(r"abtast|mess|frequenz|aufzeichn|zeit|speicher|abgetast
 SEPARATION = (r"(?:[\s:=≈~;,\"@]|\b(?:is|was|ist|est|of|von|at|à|bei|set to|about|approx|ca|env|environ|etwa)\b\.?)"
               r"{1,8}?")
 KEYED = re.compile(
-    rf"(?i:(?<![\w])(?:(?P<strong>{STRONG_RATE})|(?P<weak>{WEAK_RATE})|(?P<interval>{STRONG_INTERVAL})|"
+    rf"(?i:(?<![\w])(?:(?P<strong>{STRONG_RATE})|(?P<interval>{STRONG_INTERVAL})|(?P<weak>{WEAK_RATE})|"
     rf"(?P<weak_interval>{WEAK_INTERVAL})))(?:\s*/\s*(?P<divisor>\d+(?:\.\d+)?))?"
     rf"(?:\s*[\[(]\s*(?P<in1>[^\])]*?)\s*[\])]|\s+in\s+(?P<in2>[^\s:=]+)|[_ ](?P<in3>[A-Za-zµμ/]+))?"
-    rf"(?i:{SEPARATION})(?:(?P<clock>\d+:\d\d:\d\d(?:[.,]\d+)?)|(?P<number>{NUMBER}))(?:\s*(?:±|\+/?-)\s*[\d.,]+)?"
+    rf"(?:\s+(?:T_?s?|f_?s|dt)\s?(?==))?(?i:{SEPARATION})(?:(?P<clock>\d+:\d\d:\d\d(?:[.,]\d+)?)|(?P<number>{NUMBER}))(?:\s*(?:±|\+/?-)\s*[\d.,]+)?"
     rf"(?P<range>\s*(?:-|–|\bto\b|\bbis\b|\.\.+)\s*\d[\d.,]*)?")
 COUNTED_ALONE = re.compile(rf"(?<![\d.,'’])(?P<number>{NUMBER})\s*[\[(]?(?:{COUNTED}){END}")
 AFTER = re.compile(rf"\s*[\[(\"]?\s*(?:{UNIT}){END}")
-PROSE = re.compile(r"\s*(?:$|[^\w\s°%µΩ/^*]|(?:and|with|for|at|from|on|und|mit|für|et|avec|pour|nominal)\b)")
+IN_NEXT_CELL = re.compile(rf"\s*[,;]\s*(?:{UNIT}){END}")
+PROSE = re.compile(r"\s*(?:$|[^\w\s°%µΩ/^*]|(?:and|with|for|at|from|on|und|mit|für|et|avec|pour|nominal)\b)|\s+\w+\s?[:=]")
+MORE_CELLS = re.compile(r"(?:\s*;\s*[\d.,]+(?=\s*(?:;|$)))+")
+REVERSED = re.compile(rf"(?<![\d.,'’])(?P<number>{NUMBER})\s?(?:{UNIT}){END}[\s-]*(?i:sampl(?:e|ing)\b(?:[ _-]*(?:rate|frequency|"
+                      rf"interval|period)\b)?|abtast(?:rate|frequenz|intervall)|(?:{STRONG_RATE}|{STRONG_INTERVAL})\b)")
+PERHAPS = re.compile(rf"(?i:\b(?:rate|frequency|frequenz|fr[ée]quence)\s*[:=]\s*){NUMBER}(?:\s?[kKMGm]?Hz)?")
 NOT_THE_RATE = re.compile(r"(?:max(?:imum|imal\w*|\.)?|highest|greatest|min(?:imum|imal\w*|\.)?|original|former|old|"
                           r"up to|\d\s*|[/*×·])\s*$", re.IGNORECASE)
 SEVERAL_A_LINE = re.compile(rf"(?<![\d.])(\d+)\s+{SAMPLES}\s*(?:/|per|in each|on each|pro|par)\s*(?:line|row|zeile|ligne)",
@@ -168,13 +173,16 @@ def named_in(text, habit=Habit()):
         named, remark = _keyed(text, match, habit)
         found += [named] if named else []
         remarks += [remark] if remark else []
-    for match in COUNTED_ALONE.finditer(text):
+    for match in [*REVERSED.finditer(text), *COUNTED_ALONE.finditer(text)]:
         inside = any(start < match.end() and match.start() < end for start, end in taken)
         if not inside and not NOT_THE_RATE.search(text[:match.start()]):
-            scales, _ = _scales(match)
-            numbers = readings_of(match["number"], habit, bool(match["kilo"] or match["sps"]),
-                                  bool(CONTINENTAL.search(match[0])))
-            found.append(Named(match[0].strip(), tuple(n * s for n in numbers for s in scales)))
+            taken.append(match.span())
+            scales, inverse = _scales(match)
+            numbers = readings_of(match["number"], habit, inverse or max(scales) > 1, bool(CONTINENTAL.search(match[0])))
+            found.append(Named(match[0].strip(), tuple(1 / (n * s) if inverse else n * s for n in numbers if n
+                                                       for s in scales)))
+    if not found and not taken and (match := PERHAPS.search(text)):
+        remarks.append(f"'{match[0]}' may be the sampling rate or not")
     return [one for one in found if not one.readings or min(one.readings) > 0], remarks
 
 
@@ -184,7 +192,14 @@ def _keyed(text, match, habit):
         return None, ""
     tail = text[match.end():]
     inside = next((match[name] for name in ("in1", "in2", "in3") if match[name]), "")
+    inside = "" if re.fullmatch(r"[fF]_?s|T_?s?|dt", inside) else inside
     unit, after = _unit_in(inside), AFTER.match(tail)
+    next_cell = tail.lstrip()[:1]
+    if next_cell in (",", ";") and text[:match.start("number")].rstrip().endswith(next_cell) and match["number"]:
+        after = after or IN_NEXT_CELL.match(tail)
+        more = MORE_CELLS.match(tail)
+        if more and set(re.findall(r"[\d.,]+", more[0])) != {match["number"]}:
+            return Named(text[match.start():match.end() + more.end()], ()), ""
     if inside and not unit and (match["in3"] or not after):
         return None, ""
     words = text[match.start():match.end() + (after.end() if after and not match["clock"] else 0)].strip(" \"")

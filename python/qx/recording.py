@@ -212,7 +212,8 @@ def _told_of_columns(reader, values, chosen, time, indices):
     if time is not None:
         yield f"time from {layout.label(time)}" + (f" ({layout.units[time]})" if layout.units[time] else "")
     yield "{rate}"
-    others = [_named(layout, c, c in indices) for c in range(layout.width) if c not in (chosen, time)]
+    others = [_named(layout, c, c in indices) for c in range(layout.width)
+              if c not in (chosen, time, _date_beside(reader, time))]
     if others:
         yield f"others: {_listed(others)}"
 
@@ -382,7 +383,7 @@ def _the_named(path, named):
     """The one rate that a file names; refuses several, and one that may be read in two ways."""
     for one in named:
         if not one.readings:
-            raise InputError(f"{path}: '{one.words}' has no number that can be read: --rate says what it is")
+            raise InputError(f"{path}: '{one.words}' names no single number: --rate says what the rate is")
     sure = [one for one in named if len(one.readings) == 1]
     for one in sure:
         for other in named:

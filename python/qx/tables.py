@@ -104,6 +104,10 @@ def is_missing(cell):
     return cell.lower() in MISSING or bool(ERROR.fullmatch(cell))
 
 
+def _is_failed(cell):
+    return bool(ERROR.fullmatch(cell)) or cell.lower() in ("na", "n/a", "nan", "null")
+
+
 def number(cell, decimal, thousands=""):
     """The number in a cell, or None. NaN and infinities are numbers here."""
     cell = cell.translate(MINUS)
@@ -126,7 +130,7 @@ def cells_of(line, separator):
     if separator is None:
         return [line.strip('"').strip()]
     if separator == " ":
-        return line.split() if '"' not in line else next(
+        return re.split(r"[ \t]+", line) if '"' not in line else next(
             csv.reader([line], delimiter=" ", skipinitialspace=True))
     return [cell.strip() for cell in next(csv.reader([line], delimiter=separator, skipinitialspace=True))]
 
@@ -146,8 +150,8 @@ def _separator(lines, decimal):
     for order, separator in enumerate((";", "\t", "|", ",", " ")):
         if found in (";", "\t", "|"):
             break  # these stand in no number
-        if separator == " " and best[0] == 1:
-            break  # blanks within dates and groups of digits
+        if separator == " " and best[0] == 1 and _is_one_column(lines):
+            break  # blanks group digits
         rows = [cells_of(line, separator) for line in later]
         width, agreeing = collections.Counter(map(len, rows)).most_common(1)[0]
         if width < 2 or agreeing < 0.9 * len(rows) - 1:
@@ -160,10 +164,16 @@ def _separator(lines, decimal):
     return found
 
 
+def _is_one_column(lines):
+    """Whether a row of names above lines of single values is one name."""
+    above = list(itertools.takewhile(lambda line: not is_value(line.strip()), lines))
+    return bool(above) and len(above[-1].split()) == 1
+
+
 def _commas_belong_to_numbers(path, lines, decimal, thousands):
     """Whether commas in lines with nothing else between numbers belong to the numbers."""
     def is_one(line):
-        return any(kind.fullmatch(line.translate(MINUS)) for kind in (DECIMAL_COMMA, POINT_GROUPS, COMMA_GROUPS))
+        return any(kind.fullmatch(line.translate(MINUS)) for kind in (DECIMAL_COMMA, POINT_GROUPS, COMMA_GROUPS, SPACED))
 
     lines = [line.strip() for line in lines]
     later = lines[len(lines) // 2:]
@@ -283,11 +293,13 @@ def layout_of(path, lines, decimal=None, thousands=False):
         first = next((i for i, row in enumerate(rows) if is_data(row, valued)), None)
     if first is None:
         raise InputError(f"{path}: holds no numbers")
+    while first > 0 and len(rows[first - 1]) == width and all(_is_failed(rows[first - 1][c]) for c in valued):
+        first -= 1  # a missing value is no name
     body = [row for row in rows[first:] if len(row) == width]
     mark, groups, shown_mark = _marks(path, list(zip(*body)), decimal, thousands)
     names, units, other = _names(rows[:first], width)
     found = Layout(separator, mark, lines[first][0], names, units,
-                   [" ".join(filter(None, row)) for row in other], body, thousands=groups, shown=shown_mark)
+                   ["; ".join(filter(None, row)) for row in other], body, thousands=groups, shown=shown_mark)
     if len(rows) == 1 and width > 2:
         found.on_one_line = True
         found.names, found.units, found.body = [""], [""], [[cell] for cell in rows[0]]
@@ -331,11 +343,14 @@ class Reader:
 
     def _name_by(self, comment):
         """Takes the names of columns from the comment above the data, where it looks like a row of names."""
-        cells = [cell.strip('"') for cell in cells_of(comment, self.layout.separator)]
-        plain = all(re.match(r"[^\W\d_][^:=]{0,30}$", cell) for cell in cells)
-        if len(cells) == self.layout.width > 1 and plain and any(
-                TIME_NAME.match(cell) or re.search(r"[\[(]", cell) for cell in cells):
-            self.layout.names = cells
+        attempts = [cells_of(comment, mark) for mark in (self.layout.separator, ",", ";", "\t")]
+        attempts.append(re.findall(r"[^\s\[(]+(?:\s*[\[(][^\])]*[\])])?", comment))  # each with its unit
+        for cells in attempts:
+            plain = all(re.match(r"[^\W\d_][^:=]{0,30}$", cell) for cell in cells)
+            if len(cells) == self.layout.width > 1 and plain and any(
+                    TIME_NAME.match(cell) or re.search(r"[\[(]", cell) for cell in cells):
+                self.layout.names = cells
+                return
 
     def _open(self):
         return io.TextIOWrapper(self.source.open(), encoding=self.encoding, newline=None,

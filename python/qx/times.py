@@ -5,6 +5,7 @@ and whether two fields are minutes and seconds, is decided by all texts of a col
 
 import datetime
 import functools
+import math
 import re
 
 import numpy as np
@@ -200,7 +201,10 @@ def rate_of(times, scale=1.0):
         step, _, doubt = _line(times)
         jitter = spread / mean
         said = f", whose steps differ by up to {100 * jitter:.2g} %" if jitter > 1e-4 else ""
-        return _with_doubt(step * scale, doubt / step if said else 0.0, said)
+        # Doubt of the numbers themselves: of doubles, and of the last digit where it is a rounded one.
+        last = max(np.spacing(np.abs(times).max()), digit if spread > 1e-9 * mean else 0.0)
+        coarse = last / (times[-1] - times[0])
+        return _with_doubt(step * scale, max(doubt / step, coarse), said)
     if len(gaps) and whole:
         closed = np.delete(steps, gaps)
         step, _, doubt = _line(np.concatenate([[0.0], np.cumsum(closed)]))
@@ -240,21 +244,22 @@ def _gaps(steps, digit):
 
 
 def _with_doubt(step, doubt, said):
-    """The rate of a step, and what is said of it: the line through all times has a standard deviation."""
+    """The rate of a step, and what is said of it with the relative doubt of the line."""
     rate = rounded(1 / step, doubt)
     if said:
-        said += f": a line through all of them, {1 / step:.8g} ± {doubt / step:.1g}"
+        width = doubt / step
+        places = max(0, 1 - math.floor(math.log10(width))) if width > 0 else 6
+        said += f": a line through all of them, {1 / step:.{places}f} ± {width:.{places}f}"
     return rate, said
 
 
 def rounded(rate, doubt):
-    """The number of the fewest digits, up to seven, that a rate may be within a relative doubt."""
+    """The rate, or its reciprocal where it is below 1, with the fewest decimals, up to three, that a relative doubt
+    allows."""
+    if rate < 1:
+        return 1 / rounded(1 / rate, doubt)
     width = max(doubt, 1e-9) * rate
-    for digits in range(1, 8):
-        near = float(f"{rate:.{digits - 1}e}")
-        if abs(near - rate) <= width:
-            return near
-    return rate
+    return next((near for near in (round(rate, places) for places in range(4)) if abs(near - rate) <= width), rate)
 
 
 def last_digit(times):
@@ -262,6 +267,6 @@ def last_digit(times):
     some = np.abs(times[:2000])
     for digits in range(0, 10):
         scaled = some * 10**digits
-        if np.abs(scaled - np.round(scaled)).max() <= 1e-6 + 1e-12 * scaled.max():
+        if np.abs(scaled - np.round(scaled)).max() <= 1e-6 + 4 * np.spacing(scaled.max()):
             return 10.0**-digits
     return 0.0
