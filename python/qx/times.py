@@ -187,13 +187,13 @@ def rate_of(times, scale=1.0):
     if not np.isfinite(steps).all():
         return None, "are not all there"
     mean = (times[-1] - times[0]) / len(steps)
-    spread = np.abs(steps - mean).max()
+    spread = max(steps.max() - mean, mean - steps.min())
     digit = last_digit(times)
     if mean > 0 and steps.min() >= 0 and spread > 1e-6 * mean:
         gaps, whole = _gaps(steps, digit)
         if not len(gaps) and len(times) >= LEAST_ROUNDED:
             step, off, doubt = _line(times)
-            if np.ptp(off) <= 1.1 * digit:
+            if off <= 1.1 * digit:
                 return _with_doubt(step * scale, doubt / step, f", where times are rounded to {digit * scale:.3g} s")
     if steps.min() <= 0:
         return None, f"do not rise at sample {int(np.argmax(steps <= 0)) + 2}"
@@ -217,16 +217,22 @@ def rate_of(times, scale=1.0):
 
 
 def _line(times):
-    """The slope of the line by least squares through all times over their numbers, what is off it, and twice
-    the standard deviation of the slope."""
-    n = len(times)
-    places = np.arange(n) - (n - 1) / 2
-    off = times - times[0]
-    mean = off.mean()
+    """The slope of the line by least squares through all times over their numbers, how far those off it are apart,
+    and twice the standard deviation of the slope. In blocks, for long recordings."""
+    n, block = len(times), 1 << 16
     power = n * (n * n - 1.0) / 12
-    step = float(places @ (off - mean)) / power
-    off = off - mean - step * places
-    return step, off, 2 * float(np.sqrt(np.mean(off * off) / power))
+    total = moment = 0.0
+    for at in range(0, n, block):
+        part = times[at:at + block] - times[0]
+        total += part.sum()
+        moment += float((np.arange(at, at + len(part)) - (n - 1) / 2) @ part)
+    step = moment / power
+    low, high, squares = np.inf, -np.inf, 0.0
+    for at in range(0, n, block):
+        part = times[at:at + block] - times[0] - total / n
+        part -= step * (np.arange(at, at + len(part)) - (n - 1) / 2)
+        low, high, squares = min(low, part.min()), max(high, part.max()), squares + float(part @ part)
+    return step, high - low, 2 * math.sqrt(squares / n / power)
 
 
 def _gaps(steps, digit):
