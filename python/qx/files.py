@@ -19,20 +19,23 @@ COMPRESSED = (".gz", ".bz2", ".xz", ".zst", ".zip")
 BROKEN = (EOFError, zlib.error, lzma.LZMAError, zipfile.BadZipFile, gzip.BadGzipFile)
 
 # What begins so is read by stored.py ...
-ARRAYS = ((b"\x93NUMPY", "npy"), (b"\x89HDF\r\n\x1a\n", "hdf5"), (b"PAR1", "parquet"), (b"\xffBIOSEMI", "bdf"),
-          (b"\xd0\xcf\x11\xe0\xa1\xb1\x1a\xe1", "xls"))
+ARRAYS = ((b"\x93NUMPY", "npy"), (b"\x89HDF\r\n\x1a\n", "hdf5"), (b"PAR1", "parquet"),
+          (b"\xffBIOSEMI", "bdf"), (b"\xd0\xcf\x11\xe0\xa1\xb1\x1a\xe1", "xls"))
 # ... and what begins so by nobody here.
 FOREIGN = (
-    (rb"%PDF-", "a PDF document"), (rb"\s*<(?:!doctype html|html)", "an HTML page"), (rb"\s*<\?xml", "an XML document"),
-    (rb"\{\\rtf", "an RTF document"), (rb"\s*\{\s*\"|\s*\[\s*[\[{\"]", "JSON"), (rb"\x89PNG", "a PNG picture"),
+    (rb"%PDF-", "a PDF document"), (rb"\s*<(?:!doctype html|html)", "an HTML page"),
+    (rb"\s*<\?xml", "an XML document"), (rb"\{\\rtf", "an RTF document"),
+    (rb"\s*\{\s*\"|\s*\[\s*[\[{\"]", "JSON"), (rb"\x89PNG", "a PNG picture"),
     (rb"\xff\xd8\xff", "a JPEG picture"), (rb"GIF8", "a GIF picture"), (rb"II\*\0|MM\0\*", "a TIFF picture"),
     (rb"RIFF....AVI ", "an AVI video"), (rb"RIFF....WEBP", "a WebP picture"), (rb"....ftyp", "an MP4 video or sound"),
     (rb"\x1aE\xdf\xa3", "a Matroska video or sound"), (rb"7z\xbc\xaf\x27\x1c", "a 7z archive"),
-    (rb"Rar!\x1a\x07", "a RAR archive"), (rb".{257}ustar", "a tar archive"), (rb"SQLite format 3\0", "an SQLite database"),
-    (rb"\x7fELF", "a program"), (rb"MZ.{0,200}\0", "a program for Windows"), (rb"ARROW1|FEA1", "an Arrow (Feather) table"),
+    (rb"Rar!\x1a\x07", "a RAR archive"), (rb".{257}ustar", "a tar archive"),
+    (rb"SQLite format 3\0", "an SQLite database"), (rb"\x7fELF", "a program"),
+    (rb"MZ.{0,200}\0", "a program for Windows"), (rb"ARROW1|FEA1", "an Arrow (Feather) table"),
     (rb"ORC", "an ORC table"), (rb"CDF[\x01\x02\x05]", "a netCDF file"), (rb"SIMPLE  =", "a FITS file"),
     (rb"\x0e\x03\x13\x01", "an HDF4 file"), (rb"MDF     |UnFinMF ", "an MDF recording"),
-    (rb"GDF [12]", "a GDF recording"), (rb"ABF2?[ \0]", "an ABF recording"), (rb"\x80[\x02-\x05]", "a Python pickle"))
+    (rb"GDF [12]", "a GDF recording"), (rb"ABF2?[ \0]", "an ABF recording"),
+    (rb"\x80[\x02-\x05]", "a Python pickle"))
 BINARY = {"an ORC table", "an MP4 video or sound"}  # whose first bytes a text may have as well
 
 

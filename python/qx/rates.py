@@ -39,12 +39,15 @@ UNIT = (rf"{COUNTED}|(?P<hertz>[kKMGmuµμ]?)(?:Hz|hz|HZ)\b|(?P<word>(?i:{'|'.jo
         rf"(?P<time>(?i:{TIME}))|(?P<bare>[kM])\b")
 END = r"(?![\w^*²³⁻°%]|\s*/\s*[A-Za-z])"
 
-STRONG_RATE = (r"sampl(?:e|es|ing|er)?[ _-]*(?:rate|frequency|freq\b\.?|frequenz)|abtast[ -]*(?:rate|frequenz)|"
+STRONG_RATE = (r"sampl(?:e|es|ing|er)?[ _-]*(?:rate|frequency|freq\b\.?|frequenz)|"
+               r"abtast[ -]*(?:rate|frequenz)|"
                r"(?:fr[ée]quence|taux|cadence|fr[ée]q\.?)\s+d(?:['’]|e\s+)\s*(?:[ée]chantillonnage|acquisition)|"
                r"frecuencia de muestreo|frequenza di campionamento|acquisition[ _-]*(?:rate|frequency)|"
-               r"(?:sampled|sampling) (?:at|with)|digiti[sz]ed at|abgetastet mit|(?-i:sfreq|srate|sps|SPS)|[ée]chantillonn[ée]e? [àa]|(?-i:[fF]_?s)")
+               r"(?:sampled|sampling) (?:at|with)|digiti[sz]ed at|abgetastet mit|[ée]chantillonn[ée]e? [àa]|"
+               r"(?-i:sfreq|srate|sps|SPS|[fF]_?s)")
 WEAK_RATE = (r"(?:scan|frame|data|log(?:ging)?|recording|measur(?:ement|ing))[ _-]*(?:rate|frequency)|"
-             r"(?:mess|aufzeichnungs|log)(?:rate|frequenz)|acquired at|recorded at|aufgezeichnet mit|sampling|abtastung|[ée]chantillonnage|(?-i:Fe|FS|sr|SR|ODR)")
+             r"(?:mess|aufzeichnungs|log)(?:rate|frequenz)|acquired at|recorded at|aufgezeichnet mit|"
+             r"sampling|abtastung|[ée]chantillonnage|(?-i:Fe|FS|sr|SR|ODR)")
 STRONG_INTERVAL = (
     r"(?:sampl(?:e|es|ing)|scan|log(?:ging)?|recording|measur(?:ement|ing)|acquisition)[ _-]*(?:interval|period)|"
     r"time[ _-]*(?:step|increment)|x[ _-]?incr(?:ement)?|delta[ _-]?t|(?-i:[Δ∆]t|dt|DT)|"
@@ -53,27 +56,31 @@ STRONG_INTERVAL = (
     r"sampl(?:ed?|ing) every|one sample every")
 WEAK_INTERVAL = r"interval|intervall|intervalle|(?-i:T_?s|Te|T_?a)"
 CONTINENTAL = re.compile(r"abtast|mess|frequenz|aufzeichn|zeit|speicher|abgetastet|pro |je |[ée]chantillon|"
-                         r"fr[ée]quence|cadence|p[ée]riode|\bpas\b|\bpar\b|muestr|campion|werte|intervall", re.IGNORECASE)
-SEPARATION = (r"(?:[\s:=≈~;,\"@]|\b(?:is|was|ist|est|of|von|at|à|bei|set to|about|approx|ca|env|environ|etwa)\b\.?)"
-              r"{1,8}?")
+                         r"fr[ée]quence|cadence|p[ée]riode|\bpas\b|\bpar\b|muestr|campion|werte|intervall",
+                         re.IGNORECASE)
+SEPARATION = (r"(?:[\s:=≈~;,\"@]|\b(?:is|was|ist|est|of|von|at|à|bei|set to|about|approx|ca|env|environ|etwa)"
+              r"\b\.?){1,8}?")
 KEYED = re.compile(
     rf"(?i:(?<![\w])(?:(?P<strong>{STRONG_RATE})|(?P<interval>{STRONG_INTERVAL})|(?P<weak>{WEAK_RATE})|"
     rf"(?P<weak_interval>{WEAK_INTERVAL})))(?:\s*/\s*(?P<divisor>\d+(?:\.\d+)?))?"
     rf"(?:\s*[\[(]\s*(?P<in1>[^\])]*?)\s*[\])]|\s+in\s+(?P<in2>[^\s:=]+)|[_ ](?P<in3>[A-Za-zµμ/]+))?"
-    rf"(?:\s+(?:T_?s?|f_?s|dt)\s?(?==))?(?i:{SEPARATION})(?:(?P<clock>\d+:\d\d:\d\d(?:[.,]\d+)?)|(?P<number>{NUMBER}))(?:\s*(?:±|\+/?-)\s*[\d.,]+)?"
+    rf"(?:\s+(?:T_?s?|f_?s|dt)\s?(?==))?(?i:{SEPARATION})"
+    rf"(?:(?P<clock>\d+:\d\d:\d\d(?:[.,]\d+)?)|(?P<number>{NUMBER}))(?:\s*(?:±|\+/?-)\s*[\d.,]+)?"
     rf"(?P<range>\s*(?:-|–|\bto\b|\bbis\b|\.\.+)\s*\d[\d.,]*)?")
 COUNTED_ALONE = re.compile(rf"(?<![\d.,'’])(?P<number>{NUMBER})\s*[\[(]?(?:{COUNTED}){END}")
 AFTER = re.compile(rf"\s*[\[(\"]?\s*(?:{UNIT}){END}")
 IN_NEXT_CELL = re.compile(rf"\s*[,;]\s*(?:{UNIT}){END}")
-PROSE = re.compile(r"\s*(?:$|[^\w\s°%µΩ/^*]|(?:and|with|for|at|from|on|und|mit|für|et|avec|pour|nominal)\b)|\s+\w+\s?[:=]")
+PROSE = re.compile(r"\s*(?:$|[^\w\s°%µΩ/^*]|(?:and|with|for|at|from|on|und|mit|für|et|avec|pour|nominal)\b)|"
+                   r"\s+\w+\s?[:=]")
 MORE_CELLS = re.compile(r"(?:\s*;\s*[\d.,]+(?=\s*(?:;|$)))+")
-REVERSED = re.compile(rf"(?<![\d.,'’])(?P<number>{NUMBER})\s?(?:{UNIT}){END}[\s-]*(?i:sampl(?:e|ing)\b(?:[ _-]*(?:rate|frequency|"
-                      rf"interval|period)\b)?|abtast(?:rate|frequenz|intervall)|(?:{STRONG_RATE}|{STRONG_INTERVAL})\b)")
+REVERSED = re.compile(rf"(?<![\d.,'’])(?P<number>{NUMBER})\s?(?:{UNIT}){END}[\s-]*"
+                      rf"(?i:sampl(?:e|ing)\b(?:[ _-]*(?:rate|frequency|interval|period)\b)?|abtast(?:rate|frequenz|intervall)|"
+                      rf"(?:{STRONG_RATE}|{STRONG_INTERVAL})\b)")
 PERHAPS = re.compile(rf"(?i:\b(?:rate|frequency|frequenz|fr[ée]quence)\s*[:=]\s*){NUMBER}(?:\s?[kKMGm]?Hz)?")
-NOT_THE_RATE = re.compile(r"(?:max(?:imum|imal\w*|\.)?|highest|greatest|min(?:imum|imal\w*|\.)?|original|former|old|"
-                          r"up to|\d\s*|[/*×·])\s*$", re.IGNORECASE)
-SEVERAL_A_LINE = re.compile(rf"(?<![\d.])(\d+)\s+{SAMPLES}\s*(?:/|per|in each|on each|pro|par)\s*(?:line|row|zeile|ligne)",
-                            re.IGNORECASE)
+NOT_THE_RATE = re.compile(r"(?:max(?:imum|imal\w*|\.)?|highest|greatest|min(?:imum|imal\w*|\.)?|"
+                          r"original|former|old|up to|\d\s*|[/*×·])\s*$", re.IGNORECASE)
+SEVERAL_A_LINE = re.compile(rf"(?<![\d.])(\d+)\s+{SAMPLES}\s*(?:/|per|in each|on each|pro|par)\s*"
+                            r"(?:line|row|zeile|ligne)", re.IGNORECASE)
 
 
 @dataclasses.dataclass
@@ -88,7 +95,7 @@ class Habit:
 class Named:
     """A rate that a text names."""
     words: str
-    readings: tuple  # samples per second; more than one where the text leaves it open, none where it is no number
+    readings: tuple  # samples per second: several where the text leaves it open, none where it is no number
     assumed: str = ""  # the unit that the text leaves out
 
 
@@ -98,9 +105,9 @@ def seconds_of(unit):
 
 
 def readings_of(text, habit, small=False, continental=False):
-    """The numbers that a text may be: one, two where a mark may group thousands or begin decimals, none where
-    its groups are none. `small` says that thousands are unlikely, as of kilohertz; `continental` that the words
-    are those of a language with decimal commas."""
+    """The numbers that a text may be: one, two where a mark may group thousands or begin decimals, none
+    where its groups are none. `small` says that thousands are unlikely, as of kilohertz; `continental` that
+    the words are those of a language with decimal commas."""
     mantissa, exponent = text, 0
     if match := re.search(r"(?:[eE]|\s?[x×*·]\s?10\^?)([-+]?\d+)$", text):
         mantissa, exponent = text[:match.start()], int(match[1])
@@ -178,7 +185,8 @@ def named_in(text, habit=Habit()):
         if not inside and not NOT_THE_RATE.search(text[:match.start()]):
             taken.append(match.span())
             scales, inverse = _scales(match)
-            numbers = readings_of(match["number"], habit, inverse or max(scales) > 1, bool(CONTINENTAL.search(match[0])))
+            numbers = readings_of(match["number"], habit, inverse or max(scales) > 1,
+                                  bool(CONTINENTAL.search(match[0])))
             found.append(Named(match[0].strip(), tuple(1 / (n * s) if inverse else n * s for n in numbers if n
                                                        for s in scales)))
     if not found and not taken and (match := PERHAPS.search(text)):

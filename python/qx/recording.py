@@ -194,7 +194,8 @@ def _refuse_wrapped(reader, column):
     for note in reader.notes:
         match = rates.SEVERAL_A_LINE.search(note)
         if match and int(match[1]) > 1 and column is None:
-            raise InputError(f"{reader.path}: has {match[0]!r}, which is not read; --column takes one column all the same")
+            raise InputError(f"{reader.path}: has {match[0]!r}, which is not read; --column takes one column "
+                             "all the same")
 
 
 def _told_of_columns(reader, values, chosen, time, indices):
@@ -388,7 +389,8 @@ def _the_named(path, named):
     for one in sure:
         for other in named:
             if not any(abs(reading / one.readings[0] - 1) <= 1e-3 for reading in other.readings):
-                raise InputError(f"{path}: '{one.words}' and '{other.words}' are two sampling rates: --rate says which")
+                raise InputError(f"{path}: '{one.words}' and '{other.words}' are two sampling rates: --rate "
+                                 "says which")
     if not sure:
         many = " or ".join(f"{reading:.10g}" for reading in named[0].readings)
         raise InputError(f"{path}: '{named[0].words}' may be {many} samples per second: --rate says which")

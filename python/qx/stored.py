@@ -49,15 +49,12 @@ class Arrays:
 
     def _values(self, column, part):
         values = self.columns[column].values(part)
-        wrong = np.flatnonzero(~np.isfinite(values) if self.missing else np.isinf(values))
-        if not self.missing and np.isnan(values).any():
-            wrong = np.flatnonzero(np.isnan(values))
-            raise InputError(f"{self.path}: {self.layout.label(column)}: sample {part.start + wrong[0] + 1} is missing; "
-                             "--missing skip or --missing interpolate reads the others")
-        wrong = np.flatnonzero(np.isinf(values))
-        if len(wrong):
-            raise InputError(f"{self.path}: {self.layout.label(column)}: sample {part.start + wrong[0] + 1} is not a "
-                             "finite number")
+        for is_wrong, what in ((np.isnan, "missing; --missing skip or --missing interpolate reads the others"),
+                               (np.isinf, "not a finite number")):
+            wrong = np.flatnonzero(is_wrong(values))
+            if len(wrong) and not (self.missing and is_wrong is np.isnan):
+                raise InputError(f"{self.path}: {self.layout.label(column)}: sample {part.start + wrong[0] + 1} is "
+                                 f"{what}")
         return values
 
 

@@ -22,8 +22,8 @@ HEAD_LINES = 400
 LINES_AT_ONCE = 200_000
 COMMENTS = ("#", "%", "//")
 # What spreadsheets write where a formula failed; it begins like a comment and is none.
-ERROR = re.compile(r"#(?:N/A|NV|NA|DIV/0!|VALUE!|VALEUR!|WERT!|REF!|BEZUG!|NAME\?|NOM\?|NUM!|NOMBRE!|ZAHL!|NULL!|NUL!)",
-                   re.IGNORECASE)
+ERROR = re.compile(r"#(?:N/A|NV|NA|DIV/0!|VALUE!|VALEUR!|WERT!|REF!|BEZUG!|NAME\?|NOM\?|NUM!|NOMBRE!|ZAHL!|"
+                   r"NULL!|NUL!)(?=\s*(?:$|[;,\t|\"])|\s+[-+\d#])", re.IGNORECASE)
 MISSING = {"", "-", "--", "?", "na", "n/a", "nan", "-nan", "null", "none", "nil", "missing"}
 
 EXPONENT = r"([eEdD][-+]?\d+)?"
@@ -39,11 +39,11 @@ UNITS_ALONE = re.compile(r"[munkMµμ]?(?:V|A|g|Pa|bar|N|W)|°C|%|dB|m/s2?|m/s²
 TIME_NAME = re.compile(
     r"(?:rel(?:ative)?|abs(?:olute)?|elapsed|sample|sampling|system|utc|gps|local|unix|epoch|mess|log|start)?[ _-]?"
     r"(?P<stem>time[ _]?stamps?|date[ _-]?time|time|zeit(?:stempel|punkt)?|date|datum|uhrzeit|clock|elapsed|uptime|"
-    r"seconds?|secs?|msecs?|millis(?:econds)?|micros(?:econds)?|heure|horodatage|tiempo|fecha|temps|ts|epoch|unix|utc|"
-    r"m?jd|t|s|ms|us|µs)(?=$|[\s_/(\[,:.-])", re.IGNORECASE)
+    r"seconds?|secs?|msecs?|millis(?:econds)?|micros(?:econds)?|heure|horodatage|tiempo|fecha|temps|ts|epoch|"
+    r"unix|utc|m?jd|t|s|ms|us|µs)(?=$|[\s_/(\[,:.-])", re.IGNORECASE)
 WEAK_NAMES = {"temps", "ts", "epoch", "unix", "utc", "jd", "mjd", "us"}  # which mean other things, too
-NO_UNIT = {"in", "utc", "gmt", "local", "unix", "epoch", "since", "start", "from", "time", "date", "of", "day", "elapsed",
-           "relative", "absolute", "heure", "uhrzeit", "zeit", "stamp", "iso", "iso8601"}
+NO_UNIT = {"in", "utc", "gmt", "local", "unix", "epoch", "since", "start", "from", "time", "date", "of", "day",
+           "elapsed", "relative", "absolute", "heure", "uhrzeit", "zeit", "stamp", "iso", "iso8601"}
 INDEX_NAME = re.compile(r"#|no\.?|nr\.?|n|i|id|idx|index|row|line|sample|samples|count|unnamed: 0|",
                         re.IGNORECASE)
 KNOWN_UNIT = re.compile(r"[munkpMGµμ]?(V|A|g|Pa|bar|m|W|N|Hz|s|K|rad|T|C|F|Ohm|Ω)|°C|°F|°|deg|%|dB\w*|"
@@ -317,7 +317,8 @@ class Reader:
 
     def __init__(self, source, decimal=None, missing=None, dates=None, thousands=False):
         source = source if hasattr(source, "open") else Source(source)
-        self.source, self.path, self.name, self.missing, self.dates = source, source.path, source.name, missing, dates
+        self.source, self.path, self.name = source, source.path, source.name
+        self.missing, self.dates = missing, dates
         self.named_as_time = None  # the number of a column that is time whatever its name is
         with source.open() as file:
             start = file.read(1 << 20)
@@ -537,8 +538,8 @@ def time_unit(layout, column, named=None):
         unit = stem
     if stem in ("T", "S", "s"):  # temperature, path and others have these letters, too
         sure = re.search(r"[(\[/\s]", rest) or layout.units[column] or (
-            stem == "s" and layout.width > 1 and all(UNITS_ALONE.fullmatch(other) for i, other in enumerate(layout.names)
-                                                     if i != column))
+            stem == "s" and layout.width > 1 and all(
+                UNITS_ALONE.fullmatch(other) for i, other in enumerate(layout.names) if i != column))
         if not sure or not (stem == "s" and not rest and not unit) and seconds_of(unit) is None:
             return False, ""
     elif stem.lower() in ("t", "ms") and (unit or rest) and seconds_of(unit) is None:

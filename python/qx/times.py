@@ -27,7 +27,7 @@ ONLY_DIGITS = re.compile(r"(?:19|20)\d\d(?:0[1-9]|1[0-2])(?:0[1-9]|[12]\d|3[01])
 TIME_OF_DAY = re.compile(rf"{OF_DAY}{ZONE}|{MINUTES}")
 TWO_FIELDS = re.compile(r"(\d+):(\d\d)")
 SLASHED = re.compile(r"(\d\d?)[/-](\d\d?)[/-](\d{4}|\d\d)(?!\d)")
-ISO = re.compile(rf"\d{{4}}-\d\d-\d\d(?:[T ]\d\d:\d\d:\d\d(?:[.,]\d+)?(?:Z|[+-]\d\d:?\d\d)?)?")
+ISO = re.compile(r"\d{4}-\d\d-\d\d(?:[T ]\d\d:\d\d:\d\d(?:[.,]\d+)?(?:Z|[+-]\d\d:?\d\d)?)?")
 
 MONTHS = {name: number for number, names in enumerate((
     "jan january januar janv janvier jän jänner ene", "feb february februar févr fév février fevr",
@@ -194,7 +194,8 @@ def rate_of(times, scale=1.0):
         if not len(gaps) and len(times) >= LEAST_ROUNDED:
             step, off, doubt = _line(times)
             if off <= 1.1 * digit:
-                return _with_doubt(step * scale, doubt / step, f", where times are rounded to {digit * scale:.3g} s")
+                return _with_doubt(step * scale, doubt / step,
+                                   f", where times are rounded to {digit * scale:.3g} s")
     if steps.min() <= 0:
         return None, f"do not rise at sample {int(np.argmax(steps <= 0)) + 2}"
     if spread <= 0.01 * mean + 4e-16 * abs(times[-1]):
