@@ -51,7 +51,7 @@ WEAK_RATE = (r"(?:scan|frame|data|log(?:ging)?|recording|measur(?:ement|ing))[ _
 STRONG_INTERVAL = (
     r"(?:sampl(?:e|es|ing)|scan|log(?:ging)?|recording|measur(?:ement|ing)|acquisition)[ _-]*(?:interval|period)|"
     r"time[ _-]*(?:step|increment)|x[ _-]?incr(?:ement)?|delta[ _-]?t|(?-i:[Δ∆]t|dt|DT)|"
-    r"(?:abtast|mess|log|speicher|aufzeichnungs)(?:intervall|zeit|periode|schritt)|zeitschritt|"
+    r"(?:abtast|mess|log|speicher|aufzeichnungs)intervall|abtast(?:zeit|periode|schritt)|zeitschritt|"
     r"(?:p[ée]riode|pas|intervalle)\s+d(?:['’]|e\s+)\s*(?:[ée]chantillonnage|acquisition|temps|mesure)|"
     r"sampl(?:ed?|ing) every|one sample every")
 WEAK_INTERVAL = r"interval|intervall|intervalle|(?-i:T_?s|Te|T_?a)"
@@ -74,11 +74,13 @@ PROSE = re.compile(r"\s*(?:$|[^\w\s°%µΩ/^*]|(?:and|with|for|at|from|on|und|mi
                    r"\s+\w+\s?[:=]")
 MORE_CELLS = re.compile(r"(?:\s*;\s*[\d.,]+(?=\s*(?:;|$)))+")
 REVERSED = re.compile(rf"(?<![\d.,'’])(?P<number>{NUMBER})\s?(?:{UNIT}){END}[\s-]*"
-                      rf"(?i:sampl(?:e|ing)\b(?:[ _-]*(?:rate|frequency|interval|period)\b)?|abtast(?:rate|frequenz|intervall)|"
-                      rf"(?:{STRONG_RATE}|{STRONG_INTERVAL})\b)")
+                      rf"(?i:sampl(?:e|ing)\b(?:[ _-]*(?:rate|frequency|interval|period)\b)?|"
+                      rf"abtast(?:rate|frequenz|intervall)|(?:{STRONG_RATE}|{STRONG_INTERVAL})\b)")
 PERHAPS = re.compile(rf"(?i:\b(?:rate|frequency|frequenz|fr[ée]quence)\s*[:=]\s*){NUMBER}(?:\s?[kKMGm]?Hz)?")
 NOT_THE_RATE = re.compile(r"(?:max(?:imum|imal\w*|\.)?|highest|greatest|min(?:imum|imal\w*|\.)?|"
-                          r"original|former|old|up to|\d\s*|[/*×·])\s*$", re.IGNORECASE)
+                          r"original|former|old|up to|[/*×·])\s*$", re.IGNORECASE)
+FACTOR = re.compile(r"[\d.]+\s*$")  # before a symbol
+QUOTIENT = re.compile(r"/\s?(\d+(?:\.\d+)?)")
 SEVERAL_A_LINE = re.compile(rf"(?<![\d.])(\d+)\s+{SAMPLES}\s*(?:/|per|in each|on each|pro|par)\s*"
                             r"(?:line|row|zeile|ligne)", re.IGNORECASE)
 
@@ -196,12 +198,17 @@ def named_in(text, habit=Habit()):
 
 def _keyed(text, match, habit):
     """The rate of a match of KEYED or None, and a remark on why it is none, or an empty text."""
-    if NOT_THE_RATE.search(text[:match.start()]):
+    before = text[:match.start()]
+    if NOT_THE_RATE.search(before) or text[match.start():match.end()].lower().startswith(("fs", "f_s", "fe")) and (
+            FACTOR.search(before)):
         return None, ""
     tail = text[match.end():]
     inside = next((match[name] for name in ("in1", "in2", "in3") if match[name]), "")
     inside = "" if re.fullmatch(r"[fF]_?s|T_?s?|dt", inside) else inside
     unit, after = _unit_in(inside), AFTER.match(tail)
+    over = QUOTIENT.match(tail) if match["number"] else None
+    if over:  # 1/60 Hz
+        tail, after = tail[over.end():], AFTER.match(tail[over.end():])
     next_cell = tail.lstrip()[:1]
     if next_cell in (",", ";") and text[:match.start("number")].rstrip().endswith(next_cell) and match["number"]:
         after = after or IN_NEXT_CELL.match(tail)
@@ -210,7 +217,8 @@ def _keyed(text, match, habit):
             return Named(text[match.start():match.end() + more.end()], ()), ""
     if inside and not unit and (match["in3"] or not after):
         return None, ""
-    words = text[match.start():match.end() + (after.end() if after and not match["clock"] else 0)].strip(" \"")
+    end = match.end() + (over.end() if over else 0)
+    words = text[match.start():end + (after.end() if after and not match["clock"] else 0)].strip(" \"")
     words += ")" * (words.count("(") - words.count(")"))
     if match["range"]:
         return None, f"'{words}' is a range"
@@ -233,8 +241,8 @@ def _keyed(text, match, habit):
     if match["weak_interval"] and not inverse:
         return None, ""
     numbers = readings_of(match["number"], habit, inverse or max(scales) > 1, bool(CONTINENTAL.search(match[0])))
-    factor = float(match["divisor"] or 1)
+    factor = float(match["divisor"] or 1) / (float(over[1]) if over else 1.0)
     if min(numbers, default=1) <= 0 or factor <= 0:
         return None, ""
-    rates = tuple(factor / (n * s) if inverse else factor * n * s for n in numbers for s in scales)
+    rates = tuple(1 / (n * s * factor) if inverse and over else factor / (n * s) if inverse else factor * n * s for n in numbers for s in scales)
     return Named(words, rates, assumed), ""

@@ -23,7 +23,7 @@ LINES_AT_ONCE = 200_000
 COMMENTS = ("#", "%", "//")
 # What spreadsheets write where a formula failed; it begins like a comment and is none.
 ERROR = re.compile(r"#(?:N/A|NV|NA|DIV/0!|VALUE!|VALEUR!|WERT!|REF!|BEZUG!|NAME\?|NOM\?|NUM!|NOMBRE!|ZAHL!|"
-                   r"NULL!|NUL!)(?=\s*(?:$|[;,\t|\"])|\s+[-+\d#])", re.IGNORECASE)
+                   r"NULL!|NUL!)(?=\s*(?:$|[;,\t|\"])|(?:\s+[-+\d.,eE]+|\s+#\S+)+\s*$)", re.IGNORECASE)
 MISSING = {"", "-", "--", "?", "na", "n/a", "nan", "-nan", "null", "none", "nil", "missing"}
 
 EXPONENT = r"([eEdD][-+]?\d+)?"
@@ -144,13 +144,13 @@ def is_value(cell):
 def _separator(lines, decimal):
     """The mark that cuts the later lines into most values; None for one column."""
     later = lines[len(lines) // 2:]
-    best, found = (sum(is_value(cells_of(line, None)[0]) for line in later) / len(later), 0), None
+    best, found = (False, sum(is_value(cells_of(line, None)[0]) for line in later) / len(later), 0), None
     if decimal == "point" and any("," in line for line in later):
-        best = (0.0, 0)
+        best = (False, 0.0, 0)
     for order, separator in enumerate((";", "\t", "|", ",", " ")):
         if found in (";", "\t", "|"):
             break  # these stand in no number
-        if separator == " " and best[0] == 1 and _is_one_column(lines):
+        if separator == " " and best[1] == 1 and _is_one_column(lines):
             break  # blanks group digits
         rows = [cells_of(line, separator) for line in later]
         width, agreeing = collections.Counter(map(len, rows)).most_common(1)[0]
@@ -158,10 +158,17 @@ def _separator(lines, decimal):
             continue
         cells = [cell for row in rows for cell in row if not is_missing(cell)]
         share = sum(map(is_value, cells)) / max(1, len(cells))
-        if share > 0 and ((share, -order) > best or found is None and (
-                share >= best[0] or separator in (";", "\t", "|"))):
-            best, found = (share, -order), separator
+        rank = (_agrees_with_names(lines, separator, width), share, -order)
+        if share > 0 and (rank > best or found is None and (share >= best[1] or separator in (";", "\t", "|"))):
+            best, found = rank, separator
     return found
+
+
+def _agrees_with_names(lines, separator, width):
+    """Whether the mark cuts the line above the values into as many cells, none of them a value."""
+    rows = [cells_of(line, separator) for line in lines[:len(lines) // 2 + 1]]
+    above = list(itertools.takewhile(lambda row: not any(map(is_value, row)), rows))
+    return bool(above) and len(above[-1]) == width
 
 
 def _is_one_column(lines):
@@ -173,7 +180,8 @@ def _is_one_column(lines):
 def _commas_belong_to_numbers(path, lines, decimal, thousands):
     """Whether commas in lines with nothing else between numbers belong to the numbers."""
     def is_one(line):
-        return any(kind.fullmatch(line.translate(MINUS)) for kind in (DECIMAL_COMMA, POINT_GROUPS, COMMA_GROUPS, SPACED))
+        return any(kind.fullmatch(line.translate(MINUS)) for kind in (
+            DECIMAL_COMMA, POINT_GROUPS, COMMA_GROUPS, SPACED))
 
     lines = [line.strip() for line in lines]
     later = lines[len(lines) // 2:]

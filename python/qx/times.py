@@ -20,8 +20,9 @@ NAMED_DAY = r"\d\d?(?:\.\s?|[\s-])[^\W\d_]{3,9}\.?[\s-](?:\d{4}|\d\d)|[^\W\d_]{3
 DAY = rf"(?:{ISO_DAY}|{DOTTED_DAY}|{SLASHED_DAY}|{NAMED_DAY})"
 OF_DAY = rf"\d\d?:\d\d(?::\d\d{FRACTION})?{AMPM}"
 MINUTES = r"\d+:\d\d[.,]\d+"  # and seconds with decimals
+DURATION = rf"\d+\s?(?:days?|d|Tage?|jours?),?\s+\d\d?:\d\d:\d\d{FRACTION}"
 COMPACT = rf"\d{{8}}T\d{{4}}(?:\d\d{FRACTION})?"
-CLOCK = re.compile(rf"{DAY}(?:(?:T|,?\s+){OF_DAY}{ZONE})?|{OF_DAY}{ZONE}|{MINUTES}|{COMPACT}{ZONE}")
+CLOCK = re.compile(rf"{DAY}(?:(?:T|,?\s+){OF_DAY}{ZONE})?|{OF_DAY}{ZONE}|{MINUTES}|{DURATION}|{COMPACT}{ZONE}")
 ONLY_DIGITS = re.compile(r"(?:19|20)\d\d(?:0[1-9]|1[0-2])(?:0[1-9]|[12]\d|3[01])"
                          rf"(?:[ ]?(?:[01]\d|2[0-3])[0-5]\d(?:[0-5]\d{FRACTION})?)?")
 TIME_OF_DAY = re.compile(rf"{OF_DAY}{ZONE}|{MINUTES}")
@@ -38,7 +39,7 @@ MONTHS = {name: number for number, names in enumerate((
 DAY_NS = 86400 * 10**9
 
 PARTS = re.compile(
-    rf"(?:(?P<day>{DAY})|(?P<compact>\d{{8}}))?(?:T|,?\s+)?"
+    rf"(?:(?P<day>{DAY})|(?P<compact>\d{{8}})|(?P<elapsed>\d+)\s?(?:days?|d|Tage?|jours?)(?=[,\s]))?(?:T|,?\s+)?"
     r"(?:(?P<h>\d+):(?P<m>\d\d)(?::(?P<s>\d\d))?(?:[.,](?P<f>\d+))?|"
     r"(?P<hc>\d\d)(?P<mc>\d\d)(?:(?P<sc>\d\d)(?:[.,](?P<fc>\d+))?)?)?"
     r"\s?(?P<half>[AaPp](?=\.?[Mm]\.?))?(?:\.?[Mm]\.?)?\s?(?:Z|UTC|GMT|Uhr|(?P<zone>[+-]\d\d:?\d\d))?")
@@ -126,9 +127,11 @@ class Format:
         if not match or not cell.strip():
             return None
         part = match.groupdict()
+        if part["elapsed"] and part["s"] is None:
+            return None
         day = part["day"] or part["compact"]
         try:
-            total = _days(day, self.order) * DAY_NS if day else 0
+            total = (_days(day, self.order) if day else int(part["elapsed"] or 0)) * DAY_NS
         except ValueError:
             return None
         if part["h"] is None and part["hc"] is None:
