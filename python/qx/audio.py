@@ -15,7 +15,7 @@ FRAMES_AT_ONCE = 1 << 20
 
 
 def is_audio(path, start):
-    return start[:4] in STARTS or os.path.splitext(path)[1].lower() in ENDINGS and b"\0" in start
+    return b"\0" in start and (start[:4] in STARTS or os.path.splitext(path)[1].lower() in ENDINGS)
 
 
 def read(path, local, column, first, most, whole):

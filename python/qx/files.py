@@ -36,7 +36,9 @@ FOREIGN = (
     (rb"\x0e\x03\x13\x01", "an HDF4 file"), (rb"MDF     |UnFinMF ", "an MDF recording"),
     (rb"GDF [12]", "a GDF recording"), (rb"ABF2?[ \0]", "an ABF recording"),
     (rb"\x80[\x02-\x05]", "a Python pickle"))
-BINARY = {"an ORC table", "an MP4 video or sound"}  # whose first bytes a text may have as well
+# Their first bytes a text may have as well, but no byte 0.
+BINARY = {"an ORC table", "an MP4 video or sound", "an ABF recording", "an Arrow (Feather) table",
+          "an MDF recording"}
 
 
 class InputError(Exception):
@@ -126,7 +128,7 @@ class Source:
         if not self._unpack and self.members:
             return self._kind_of_archive()
         for start, kind in ARRAYS:
-            if self.head.startswith(start):
+            if self.head.startswith(start) and (kind != "parquet" or b"\0" in self.head):
                 return kind
         if self.head[512:520] == ARRAYS[1][0]:
             return "hdf5"  # behind a block of its maker's

@@ -114,13 +114,14 @@ def read(path, rate=None, column=None, decimal=None, missing=None, start=0, time
 @contextlib.contextmanager
 def opened(path):
     """The contents of a file (files.Source). What goes wrong with the file itself is an InputError."""
+    name = "standard input" if path == files.PIPE else path
     try:
         with files.Source(path) as source:
             yield source
     except files.BROKEN as error:
-        raise InputError(f"{path}: cannot be unpacked, perhaps cut off: {error}") from None
+        raise InputError(f"{name}: cannot be unpacked, perhaps cut off: {error}") from None
     except OSError as error:
-        raise InputError(f"{path}: cannot be read: {error.strerror or error}") from None
+        raise InputError(f"{name}: cannot be read: {error.strerror or error}") from None
 
 
 def table_of(source, time, options, *wanted):
@@ -336,9 +337,10 @@ def _rate(reader, seconds, time, habit):
     layout, reasons, named = reader.layout, [], []
     if reader.where == "the file":
         habit = rates.Habit(told=".")
+        named = list(filter(None, map(stored.rate_in, reader.notes)))
     for text in [*reader.notes, *layout.names]:
         found, remarks = rates.named_in(text, habit)
-        named += found
+        named += [one for one in found if text not in {other.words for other in named}]
         reasons += remarks
     if time is not None and len(seconds) > 1:
         scale, unit_said = _scale(reader, time, seconds)
@@ -436,7 +438,7 @@ def _of_days(name, first, numbers):
         near % unit == 0 for unit in (86400, 3600, 300, 60)) or near in (1, 2, 3, 4, 5, 6, 10, 12, 15, 20, 30))
     if in_days and not in_seconds:
         return days
-    if in_seconds and not in_days or not in_days:
+    if not in_days:
         return 1.0, UNSAID
     return None, f"the times from {first:.10g} may be seconds or days of a spreadsheet"
 

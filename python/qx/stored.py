@@ -6,16 +6,27 @@ missing the refusal names it.
 
 import datetime
 import io
+import re
 
 import numpy as np
 
 from .files import InputError, needs
+from .rates import Named
 from .tables import Layout, Reader
 
 ROWS_AT_ONCE = 1 << 20
 SAMPLE = 400
 RATE_NAMES = {"rate", "sr", "fs", "sfreq", "srate", "samplerate", "sample_rate", "samp_rate", "sampling_rate",
               "samplingrate", "sampling_frequency", "samplingfrequency", "framerate"}
+
+
+def rate_in(note):
+    """The rate (rates.Named) of a number whose name says nothing else, or None."""
+    name, _, value = note.partition(" = ")
+    number = re.fullmatch(r"(\d[\d.e+-]*)( Hz)?", value)
+    if name.lower() not in RATE_NAMES or not number or float(number[1]) <= 0:
+        return None
+    return Named(note, (float(number[1]),), "" if number[2] else "hertz")
 
 
 class Arrays:
@@ -120,8 +131,7 @@ def assembled(source, arrays, notes, wanted):
         if np.ndim(data) == 0 or np.size(data) == 1 and not getattr(data.dtype, "names", None):
             value = np.asarray(data).reshape(-1)[0]
             if np.asarray(value).dtype.kind in "iuf":
-                said = "sampling rate" if name.split("/")[-1].lower() in RATE_NAMES else name.split("/")[-1]
-                notes.append(f"{said} = {float(value):.17g}" + (f" {unit}" if unit else ""))
+                notes.append(f"{name.split('/')[-1]} = {float(value):.17g}" + (f" {unit}" if unit else ""))
             continue
         columns += columns_of(path, name, data, unit)
     if not columns:
@@ -186,8 +196,9 @@ def read_hdf5(source, wanted):
     arrays, notes = [], [*_attributes(file)]
 
     def visit(name, item):
-        if name.startswith("#"):
-            return
+        if name.startswith("#") or any(value in (b"char", "char") for kind, value in item.attrs.items()
+                                       if kind.endswith("_class")):
+            return  # references and texts of other programs
         notes.extend(_attributes(item))
         if isinstance(item, h5py.Dataset) and item.dtype.kind in "iufbcV":
             unit = item.attrs.get("units", item.attrs.get("unit", ""))
@@ -204,11 +215,10 @@ def _attributes(item):
     for name, value in item.attrs.items():
         value = value.decode(errors="replace") if isinstance(value, bytes) else value
         if isinstance(value, str):
-            if name.lower() not in ("unit", "units", "class", "version", "title"):
+            if name.lower() not in ("unit", "units", "class", "version", "title") and not name.endswith("_class"):
                 yield f"{name} = {value}"
         elif np.size(value) == 1 and np.asarray(value).dtype.kind in "iuf":
-            said = "sampling rate" if name.lower() in RATE_NAMES else name
-            yield f"{said} = {float(np.asarray(value).reshape(-1)[0]):.17g}"
+            yield f"{name} = {float(np.asarray(value).reshape(-1)[0]):.17g}"
 
 
 def read_parquet(source, wanted):

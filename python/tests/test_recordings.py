@@ -172,7 +172,7 @@ class WhatProgramsKeep(InFolder):
         self.holds(path, 250, says=["time from column 1, t", "of other lengths: odd (7 samples)"])
         self.holds(path, None, "--column", "odd", values=np.ones(7))
         np.savez_compressed(path, x=RAMP, fs=44.125)  # with three decimals, which group nothing here
-        self.holds(path, 44.125, says=["'sampling rate = 44.125', taken as hertz"])
+        self.holds(path, 44.125, says=["'fs = 44.125', taken as hertz"])
         when = np.datetime64("2024-01-01T00:00:00") + np.arange(100) * np.timedelta64(2, "ms")
         np.savez(path, when=when, x=RAMP)
         self.holds(path, 500)
@@ -201,7 +201,7 @@ class WhatProgramsKeep(InFolder):
     def test_tables_of_columns(self):
         import pandas
         path = self.folder / "a.parquet"
-        path.write_bytes(b"PAR1")
+        path.write_bytes(b"PAR1" + bytes(9))
         frame = pandas.DataFrame({"t (ms)": np.arange(0, 400, 4), "u": RAMP, "label": ["x"] * 100})
         with mock.patch.object(pandas, "read_parquet", lambda _: frame):
             self.holds(path, 250, says=["column 2 of 2, u"])
@@ -257,7 +257,7 @@ class WhatProgramsKeep(InFolder):
 
     def test_files_of_others_are_refused_by_name(self):
         for content, name in ((b"%PDF-1.4\n", "a PDF document"), (b"SQLite format 3\0", "an SQLite database"),
-                              (b"\x89PNG\r\n", "a PNG picture"), (b"MDF     4.10", "an MDF recording"),
+                              (b"\x89PNG\r\n", "a PNG picture"), (b"MDF     4.10\0", "an MDF recording"),
                               (b"\0\0\0\x20ftypmp42", "an MP4 video or sound"), (b"\x7fELF\1", "a program"),
                               (b"{\\rtf1", "an RTF document"), (b"GDF 2.10", "a GDF recording")):
             path = self.folder / "measurement.csv"
