@@ -182,6 +182,9 @@ def over_midnight(seconds):
 # The rate of times
 
 LEAST_ROUNDED = 8  # times, so that an even line through all of them is no accident
+# Digits between the extremes off the line of rounded times: 1 off the best line of all, more off that by least
+# squares; 1.36 holds for 999 of 1000 series of 8 to 400 times with random steps.
+ROUNDED_WITHIN = 1.36
 
 
 def rate_of(times, scale=1.0):
@@ -196,7 +199,7 @@ def rate_of(times, scale=1.0):
         gaps, whole = _gaps(steps, digit)
         if not len(gaps) and len(times) >= LEAST_ROUNDED:
             step, off, doubt = _line(times)
-            if off <= 1.1 * digit:
+            if off <= ROUNDED_WITHIN * digit:
                 return _with_doubt(step * scale, doubt / step,
                                    f", where times are rounded to {digit * scale:.3g} s")
     if steps.min() <= 0:
@@ -222,7 +225,8 @@ def rate_of(times, scale=1.0):
 
 def _line(times):
     """The slope of the line by least squares through all times over their numbers, how far those off it are apart,
-    and twice the standard deviation of the slope. In blocks, for long recordings."""
+    and twice the standard deviation of the slope, where values on one side of the line count as one. In blocks, for
+    long recordings."""
     n, block = len(times), 1 << 16
     power = n * (n * n - 1.0) / 12
     total = moment = 0.0
@@ -231,12 +235,16 @@ def _line(times):
         total += part.sum()
         moment += float((np.arange(at, at + len(part)) - (n - 1) / 2) @ part)
     step = moment / power
-    low, high, squares = np.inf, -np.inf, 0.0
+    low, high, squares, crossings, last = np.inf, -np.inf, 0.0, 0, 0.0
     for at in range(0, n, block):
         part = times[at:at + block] - times[0] - total / n
         part -= step * (np.arange(at, at + len(part)) - (n - 1) / 2)
         low, high, squares = min(low, part.min()), max(high, part.max()), squares + float(part @ part)
-    return step, high - low, 2 * math.sqrt(squares / n / power)
+        above = part > 0
+        crossings += int(np.count_nonzero(above[1:] != above[:-1])) + (at > 0 and bool(above[0]) != (last > 0))
+        last = part[-1]
+    runs = max(1.0, n / (2 * crossings + 1))  # values of one sign in a row, where independent ones have two
+    return step, high - low, 2 * math.sqrt(squares / n / power * runs)
 
 
 def _gaps(steps, digit):
