@@ -196,6 +196,13 @@ def named_in(text, habit=Habit()):
     return [one for one in found if not one.readings or min(one.readings) > 0], remarks
 
 
+def _of_clock(match, words):
+    """The rate of an interval of hours, minutes and seconds, or None."""
+    hours, minutes, seconds = match["clock"].replace(",", ".").split(":")
+    length = 3600 * int(hours) + 60 * int(minutes) + float(seconds)
+    return Named(words, (1 / length,)) if length > 0 and (match["interval"] or match["weak_interval"]) else None
+
+
 def _keyed(text, match, habit):
     """The rate of a match of KEYED or None, and a remark on why it is none, or an empty text."""
     before = text[:match.start()]
@@ -223,10 +230,7 @@ def _keyed(text, match, habit):
     if match["range"]:
         return None, f"'{words}' is a range"
     if match["clock"]:
-        hours, minutes, seconds = match["clock"].replace(",", ".").split(":")
-        length = 3600 * int(hours) + 60 * int(minutes) + float(seconds)
-        is_interval = match["interval"] or match["weak_interval"]
-        return (Named(words, (1 / length,)), "") if is_interval and length > 0 else (None, "")
+        return _of_clock(match, words), ""
     unit, assumed = after or unit, ""
     by_interval = bool(match["interval"] or match["weak_interval"])
     if not unit:
@@ -241,8 +245,9 @@ def _keyed(text, match, habit):
     if match["weak_interval"] and not inverse:
         return None, ""
     numbers = readings_of(match["number"], habit, inverse or max(scales) > 1, bool(CONTINENTAL.search(match[0])))
-    factor = float(match["divisor"] or 1) / (float(over[1]) if over else 1.0)
+    numbers = [n / float(over[1]) for n in numbers] if over and float(over[1]) else numbers
+    factor = float(match["divisor"] or 1)
     if min(numbers, default=1) <= 0 or factor <= 0:
         return None, ""
-    rates = tuple(1 / (n * s * factor) if inverse and over else factor / (n * s) if inverse else factor * n * s for n in numbers for s in scales)
+    rates = tuple(factor / (n * s) if inverse else factor * n * s for n in numbers for s in scales)
     return Named(words, rates, assumed), ""
