@@ -42,6 +42,9 @@ inline Extended operator+(Extended a, Extended b) {
     return QuickSum(s.high, s.low + (a.low + b.low));
 }
 
+inline Extended operator-(Extended a) { return {-a.high, -a.low}; }
+inline Extended operator-(Extended a, Extended b) { return a + -b; }
+
 inline Extended operator*(Extended a, Extended b) {
     const Extended p = ExactProduct(a.high, b.high);
     return QuickSum(p.high, p.low + (a.high * b.low + a.low * b.high));

@@ -3,6 +3,7 @@
 #include "frame/constants.h"
 #include "special/digamma.h"
 #include "special/extended.h"
+#include "special/logarithms.h"
 #include "special/rational.h"
 #include "special/reciprocal_gamma.h"
 #include "special/gamma.h"
@@ -18,13 +19,6 @@ constexpr double kTiny = 1e-20;
 constexpr double kGammasTo = 33;
 constexpr double kHuge = 1e12;
 constexpr double kDirectTo = 50; // the product of three gammas stays in range
-
-// ln gamma(x) - ((x - 1/2) ln x - x + ln sqrt(2 pi)), x >= 10, to full precision of its sum with 1.
-double StirlingCorrection(double x) {
-    constexpr double c[] = {1.0 / 12,   -1.0 / 360,      1.0 / 1260, -1.0 / 1680,
-                            1.0 / 1188, -691.0 / 360360, 1.0 / 156,  -3617.0 / 122400};
-    return Horner(c, 1 / (x * x)) / x;
-}
 
 // (p / s)^p, 0 < p < s, whose base is raised in two parts since the power multiplies its error by
 // p.
