@@ -14,8 +14,8 @@ QX_BEGIN_DECLS
     are zeros, fewer are the first ones): X[k] = c(k) sqrt(2/n) sum over j of x[j] cos(pi k (2j+1) /
     (2n)), c(0) = 1/sqrt(2), else 1. J. Makhoul, "A fast cosine transform in one and two
     dimensions", 1980.
-    Codes: ErrEmptyInput (in is empty), the host's status, ErrOutOfMemory (no memory). Every failure
-    empties out. */
+    Codes: ErrEmptyInput (in is empty), the host's status, ErrInternal (the word holds something
+    else than a plan), ErrOutOfMemory (no memory). Every failure empties out. */
 QX_API ErrorCode DCT_1DH(QX_IN DBL1D in, QX_OUT DBL1D out, int32_t size, QX_INOUT PlanSlot *slot);
 /** As DCT_1DH, with its plan in the host's instance data. */
 QX_API ErrorCode DCT_1DH_IDP(QX_IN DBL1D in, QX_OUT DBL1D out, int32_t size,
@@ -23,24 +23,24 @@ QX_API ErrorCode DCT_1DH_IDP(QX_IN DBL1D in, QX_OUT DBL1D out, int32_t size,
 
 /** Sine transform, type I, unscaled, of `size` values (as in DCT_1DH): X[k] = sum over j of x[j]
     sin(pi (j+1) (k+1) / (n+1)).
-    Codes: ErrEmptyInput (in is empty), the host's status, ErrOutOfMemory (no memory). Every failure
-    empties out. */
+    Codes: ErrEmptyInput (in is empty), the host's status, ErrInternal (the word holds something
+    else than a plan), ErrOutOfMemory (no memory). Every failure empties out. */
 QX_API ErrorCode DST_1DH(QX_IN DBL1D in, QX_OUT DBL1D out, int32_t size, QX_INOUT PlanSlot *slot);
 /** As DST_1DH, with its plan in the host's instance data. */
 QX_API ErrorCode DST_1DH_IDP(QX_IN DBL1D in, QX_OUT DBL1D out, int32_t size,
                              QX_INOUT InstanceWord *instance);
 
 /** The inverse of DCT_1DH: type III, orthonormal, of the whole input.
-    Codes: ErrEmptyInput (in is empty), the host's status, ErrOutOfMemory (no memory for the plan).
-    Every failure empties out. Without work memory the result is 0 and out, of full size, is not
-    written. */
+    Codes: ErrEmptyInput (in is empty), the host's status, ErrInternal (the word holds something
+    else than a plan), ErrOutOfMemory (no memory for the plan). Every failure empties out. Without
+    work memory the result is 0 and out, of full size, is not written. */
 QX_API ErrorCode InvDCT_1DH(QX_IN DBL1D in, QX_OUT DBL1D out, QX_INOUT PlanSlot *slot);
 /** As InvDCT_1DH, with its plan in the host's instance data. */
 QX_API ErrorCode InvDCT_1DH_IDP(QX_IN DBL1D in, QX_OUT DBL1D out, QX_INOUT InstanceWord *instance);
 
 /** The inverse of DST_1DH: x[j] = 2/(n+1) sum over k of X[k] sin(pi (j+1) (k+1) / (n+1)).
-    Codes: ErrEmptyInput (in is empty), the host's status, ErrOutOfMemory (no memory). Every failure
-    empties out. */
+    Codes: ErrEmptyInput (in is empty), the host's status, ErrInternal (the word holds something
+    else than a plan), ErrOutOfMemory (no memory). Every failure empties out. */
 QX_API ErrorCode InvDST_1DH(QX_IN DBL1D in, QX_OUT DBL1D out, QX_INOUT PlanSlot *slot);
 /** As InvDST_1DH, with its plan in the host's instance data. */
 QX_API ErrorCode InvDST_1DH_IDP(QX_IN DBL1D in, QX_OUT DBL1D out, QX_INOUT InstanceWord *instance);
@@ -49,8 +49,8 @@ QX_API ErrorCode InvDST_1DH_IDP(QX_IN DBL1D in, QX_OUT DBL1D out, QX_INOUT Insta
     the input where below 1; zeros beyond it). slotA keeps the plan of the columns, slotB that of
     the rows. Memory is as large as rows and cols say, however small `in` is; a rows cols above 2^31
     - 1 is refused before any is taken.
-    Codes: ErrEmptyInput (in is empty), ErrOutOfMemory (no memory), the host's status. Every failure
-    empties out. */
+    Codes: ErrEmptyInput (in is empty), ErrInternal (the word holds something else than a plan),
+   ErrOutOfMemory (no memory), the host's status. Every failure empties out. */
 QX_API ErrorCode DCT_2DH(QX_IN DBL2D in, QX_OUT DBL2D out, int32_t rows, int32_t cols,
                          QX_INOUT PlanSlot *slotA, QX_INOUT PlanSlot *slotB);
 /** As DCT_2DH, with its plans in the host's instance data. */
@@ -58,8 +58,8 @@ QX_API ErrorCode DCT_2DH_IDP(QX_IN DBL2D in, QX_OUT DBL2D out, int32_t rows, int
                              QX_INOUT InstanceWord *instance);
 
 /** As DST_1DH, of all rows, then of all columns; sizes and slots as in DCT_2DH.
-    Codes: ErrEmptyInput (in is empty), ErrOutOfMemory (no memory), the host's status. Every failure
-    empties out. */
+    Codes: ErrEmptyInput (in is empty), ErrInternal (the word holds something else than a plan),
+    ErrOutOfMemory (no memory), the host's status. Every failure empties out. */
 QX_API ErrorCode DST_2DH(QX_IN DBL2D in, QX_OUT DBL2D out, int32_t rows, int32_t cols,
                          QX_INOUT PlanSlot *slotA, QX_INOUT PlanSlot *slotB);
 /** As DST_2DH, with its plans in the host's instance data. */

@@ -187,7 +187,8 @@ enum QXErrorCode {
     /* ANOVA: the final test of the chosen design failed. */
     ErrAnovaDesign = -20166,
     /* An inner consistency check failed: a plan whose length is not the transform's, an
-       impossible state, an inner solver's unknown result. */
+       impossible state, an inner solver's unknown result. Also two outputs that are one array, and
+       a word of a node that holds something of another kind. */
     ErrInternal = -20999,
     /* Complex Bessel family inner status 1. */
     ErrBesselStatusOne = -23039,

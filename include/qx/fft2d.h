@@ -16,8 +16,8 @@ QX_BEGIN_DECLS
     cols above 2^31 - 1 is refused before any memory is taken, a negative start last, when the host
     has given the output.
     Codes: ErrEmptyInput (in is empty), ErrIndexOutOfRange (a start behind the end),
-    ErrSizesDisagree (rows or cols below 1), ErrOutOfMemory (no memory), the host's status,
-    ErrIndexOutOfRange (a negative start). */
+    ErrSizesDisagree (rows or cols below 1), ErrInternal (the word holds something else than a
+    plan), ErrOutOfMemory (no memory), the host's status, ErrIndexOutOfRange (a negative start). */
 QX_API ErrorCode CxFFT2D_H(QX_IN CDB2D in, int32_t rowStart, int32_t colStart, int32_t rows,
                            int32_t cols, int32_t shift, QX_OUT CDB2D out,
                            QX_INOUT PlanSlot *slotCols, QX_INOUT PlanSlot *slotRows);
@@ -38,7 +38,8 @@ QX_API ErrorCode ReFFT2D_H_IDP(QX_IN DBL2D in, int32_t rowStart, int32_t colStar
 /** The inverse transform of a rows by cols matrix X, which is in shifted order if `shift` is
     non-zero: x[a][b] = 1/(rows cols) sum over r and c of X[r][c] exp(2 pi i (r a / rows + c b /
     cols)). slotCols keeps the plan of the column count, slotRows that of the row count.
-    Codes: ErrEmptyInput (in is empty), ErrOutOfMemory (no memory), the host's status. */
+    Codes: ErrEmptyInput (in is empty), ErrInternal (the word holds something else than a plan),
+    ErrOutOfMemory (no memory), the host's status. */
 QX_API ErrorCode CxInvFFT2D_H(QX_IN CDB2D in, int32_t shift, QX_OUT CDB2D out,
                               QX_INOUT PlanSlot *slotCols, QX_INOUT PlanSlot *slotRows);
 /** As CxInvFFT2D_H, with its plans in the host's instance data. */

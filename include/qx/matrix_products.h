@@ -17,8 +17,9 @@ QX_BEGIN_DECLS
 /** Matrix product c = a b of an m by k and a k by n matrix. Where k is 0 every element of c is
     NaN; where m or n is 0, c has no element. Products of more than 32768 terms run through BLAS,
     and their last bits depend on the processor; smaller ones are summed in ascending order.
-    Codes: ErrInnerDimensionMismatch (a has not as many columns as b has rows), ErrOutOfMemory (no
-    memory, or the host refused the resize). */
+    Codes: ErrInnerDimensionMismatch (a has not as many columns as b has rows),
+    ErrNegativeDimension (a size is below 0), ErrOutOfMemory (no memory, or the host refused the
+    resize). */
 QX_API int32_t MatrixMulAligned_head(QX_IN DBL2D a, QX_IN DBL2D b, QX_OUT DBL2D c,
                                      int32_t alignedCopy, QX_OUT ErrorCode *err);
 /** As MatrixMulAligned_head, with alignedCopy 0. */
@@ -44,8 +45,9 @@ QX_API int32_t AxVectorCxAligned(QX_IN CDB2D a, QX_IN CDB1D x, QX_OUT CDB1D y, i
 QX_API int32_t AxVectorCx(QX_IN CDB2D a, QX_IN CDB1D x, QX_OUT CDB1D y, QX_OUT ErrorCode *err);
 
 /** y = x a with x as a matrix of one row, by the product of matrices.
-    Codes: ErrInnerDimensionMismatch (x has not as many elements as a has rows), ErrOutOfMemory (no
-    memory, or the host refused the resize). */
+    Codes: ErrInnerDimensionMismatch (x has not as many elements as a has rows),
+    ErrNegativeDimension (a size is below 0), ErrOutOfMemory (no memory, or the host refused the
+    resize). */
 QX_API int32_t vectxAAligned_head(QX_IN DBL1D x, QX_IN DBL2D a, QX_OUT DBL1D y, int32_t alignedCopy,
                                   QX_OUT ErrorCode *err);
 /** As vectxAAligned_head, with alignedCopy 0. */

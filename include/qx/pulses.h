@@ -9,7 +9,9 @@
 
    The counters of the histogram are kept from call to call in a slot: a word of the caller's, null
    at first, of which the host is told so that it can clean up. An _IDP export keeps them in the
-   host's instance data, which MeasurementUnreserveProc gives back, and is otherwise its twin.
+   host's instance data, which MeasurementUnreserveProc gives back, and is otherwise its twin. A
+   word that holds what a slot of another kind, an _IDP export or a transform keeps is refused; any
+   other address in it cannot be told from counters and must not stand there.
 
    The counters take 4 bytes a bin for as long as the slot holds them, and every call that finds
    levels by histogram or automatically clears and scans them all, however short the waveform is.
@@ -52,11 +54,12 @@ typedef void *MeasurementInstanceWord;
 
 /** The levels of the two states and their difference. method: 0 to 2 those of QXLevelMethod.
     Codes: ErrMeasureNullState (a pointer is null), ErrMeasureEmptyChannel (bins below 1),
-    ErrMeasureTooManyChannels (unknown method), ErrOutOfMemory (no memory for the counters),
-    ErrMeasureEmpty (y is empty), ErrMeasureLevelsReversed (dt is not above 0), ErrInvalidSelector
-    (limit is neither 0 nor 1), ErrMeasureNotPositive (y is flat, which peaks allow, has no numbers,
-    or spans more than a number can), WarnMeasurePartial (by histogram: the bin of a state holds
-    fewer than 5% of the samples; the results stand). */
+    ErrMeasureTooManyChannels (unknown method), ErrInternal (the word holds something else than
+    counters), ErrOutOfMemory (no memory for the counters), ErrMeasureEmpty (y is empty),
+    ErrMeasureLevelsReversed (dt is not above 0), ErrInvalidSelector (limit is neither 0 nor 1),
+    ErrMeasureNotPositive (y is flat, which peaks allow, has no numbers, or spans more than a number
+    can), WarnMeasurePartial (by histogram: the bin of a state holds fewer than 5% of the samples;
+    the results stand). */
 QX_API ErrorCode StateLevels(QX_IN DBL1D y, double t0, double dt, int32_t method, int32_t bins,
                              QX_INOUT MeasurementSlot *slot, QX_OUT double *high,
                              QX_OUT double *low, QX_OUT double *amplitude, int32_t limit);
@@ -75,13 +78,13 @@ QX_API ErrorCode StateLevels_IDP(QX_IN DBL1D y, double t0, double dt, int32_t me
     crossings are found as sample numbers plus t0, so a t0 far beyond the number of samples costs
     digits, and beyond some 1e16 times that number duration and period are 0 and dutyCycle is NaN.
     Codes: ErrMeasureNullState (a pointer is null), ErrMeasureEmptyChannel (bins below 1),
-    ErrMeasureTooManyChannels (unknown method), ErrOutOfMemory (no memory for the counters),
-    ErrMeasureBadCount (pulseNumber below 1), ErrMeasureEmpty (y is empty), ErrMeasureLevelsReversed
-    (dt is not above 0), ErrInvalidSelector (limit or polarity is neither 0 nor 1),
-    ErrMeasureNotPositive (no amplitude, as in StateLevels), ErrMeasureRangeReversed (the references
-    are out of order), ErrMeasureOutOfMemory (no memory for the crossings, at most as many as y has
-    samples; or pulseNumber above about 8e7), ErrMeasureSearchShort (too few crossings),
-    WarnMeasurePartial (as in StateLevels). */
+    ErrMeasureTooManyChannels (unknown method), ErrInternal (the word holds something else than
+   counters), ErrOutOfMemory (no memory for the counters), ErrMeasureBadCount (pulseNumber below 1),
+   ErrMeasureEmpty (y is empty), ErrMeasureLevelsReversed (dt is not above 0), ErrInvalidSelector
+   (limit or polarity is neither 0 nor 1), ErrMeasureNotPositive (no amplitude, as in StateLevels),
+   ErrMeasureRangeReversed (the references are out of order), ErrMeasureOutOfMemory (no memory for
+   the crossings, at most as many as y has samples; or pulseNumber above about 8e7),
+   ErrMeasureSearchShort (too few crossings), WarnMeasurePartial (as in StateLevels). */
 QX_API ErrorCode PulseMeasEx(QX_IN DBL1D y, double t0, double dt, uint16_t polarity,
                              uint16_t partial, int32_t pulseNumber,
                              QX_IN const ReferenceLevels *ref, QX_IN const HistogramOptions *hist,
@@ -114,14 +117,14 @@ QX_API ErrorCode PulseMeas(QX_IN DBL1D y, double t0, double dt, uint16_t polarit
     undershoot below it, and inside it there is none. Afterwards `ref` has absolute levels, and its
     `percent` as it was; a failure leaves it.
     Codes: ErrMeasureNullState (a pointer is null), ErrMeasureEmptyChannel (bins below 1),
-    ErrMeasureTooManyChannels (unknown method), ErrOutOfMemory (no memory for the counters),
-    ErrMeasureBadCount (number below 1), ErrMeasureEmpty (y is empty), ErrMeasureLevelsReversed (dt
-    is not above 0), ErrInvalidSelector (limit or polarity is neither 0 nor 1),
-    ErrMeasureNotPositive (no amplitude, as in StateLevels and for peaks as well),
-    ErrMeasureRangeReversed (the references are out of order), ErrMeasureOutOfMemory (no memory for
-    the transitions, at most as many as y has samples; or number above about 3e7),
-    ErrMeasureTooFewPoints (there is no such transition), ErrMeasureOutOfRange (the duration is not
-    above 0), WarnMeasurePartial (as in StateLevels, for peaks as well). */
+    ErrMeasureTooManyChannels (unknown method), ErrInternal (the word holds something else than
+   counters), ErrOutOfMemory (no memory for the counters), ErrMeasureBadCount (number below 1),
+   ErrMeasureEmpty (y is empty), ErrMeasureLevelsReversed (dt is not above 0), ErrInvalidSelector
+   (limit or polarity is neither 0 nor 1), ErrMeasureNotPositive (no amplitude, as in StateLevels
+   and for peaks as well), ErrMeasureRangeReversed (the references are out of order),
+   ErrMeasureOutOfMemory (no memory for the transitions, at most as many as y has samples; or number
+   above about 3e7), ErrMeasureTooFewPoints (there is no such transition), ErrMeasureOutOfRange (the
+   duration is not above 0), WarnMeasurePartial (as in StateLevels, for peaks as well). */
 QX_API ErrorCode TransMeas(QX_IN DBL1D y, double t0, double dt, uint16_t polarity, int32_t number,
                            QX_INOUT ReferenceLevels *ref, QX_IN const HistogramOptions *hist,
                            QX_INOUT MeasurementSlot *slot, QX_OUT double *slewRate,
@@ -147,12 +150,13 @@ QX_API ErrorCode TransMeas_IDP(QX_IN DBL1D y, double t0, double dt, uint16_t pol
     on, make mean and rms infinite or NaN. Afterwards `ref` has absolute levels, and its `percent`
     as it was; a failure leaves it. Codes: ErrMeasureNullState (a pointer is null),
     ErrMeasureEmptyChannel (bins below 1), ErrMeasureTooManyChannels (unknown method),
-    ErrOutOfMemory (no memory for the counters), ErrMeasureBadCount (cycleNumber below 1),
-    ErrMeasureEmpty (y is empty), ErrMeasureLevelsReversed (dt is not above 0), ErrInvalidSelector
-    (limit is neither 0 nor 1), ErrMeasureNotPositive (no amplitude, as in StateLevels),
-    ErrMeasureRangeReversed (the references are out of order), ErrMeasureOutOfMemory (no memory for
-    so many crossings), ErrMeasureSearchShort (too few crossings), ErrMeasureNotFound (a cycle of no
-    samples), WarnMeasurePartial (as in StateLevels). */
+    ErrInternal (the word holds something else than counters), ErrOutOfMemory (no memory for the
+   counters), ErrMeasureBadCount (cycleNumber below 1), ErrMeasureEmpty (y is empty),
+   ErrMeasureLevelsReversed (dt is not above 0), ErrInvalidSelector (limit is neither 0 nor 1),
+   ErrMeasureNotPositive (no amplitude, as in StateLevels), ErrMeasureRangeReversed (the references
+   are out of order), ErrMeasureOutOfMemory (no memory for so many crossings), ErrMeasureSearchShort
+   (too few crossings), ErrMeasureNotFound (a cycle of no samples), WarnMeasurePartial (as in
+   StateLevels). */
 QX_API ErrorCode CycleRMSAverage(QX_IN DBL1D y, double t0, double dt, int32_t cycleNumber,
                                  QX_INOUT ReferenceLevels *ref, QX_IN const HistogramOptions *hist,
                                  QX_INOUT MeasurementSlot *slot, QX_OUT double *mean,
@@ -186,7 +190,7 @@ QX_API int32_t PulseParameters(QX_IN DBL1D y, QX_OUT double *top, QX_OUT double 
                                QX_OUT double *undershoot, QX_OUT ErrorCode *err);
 
 /** Gives the counters of an _IDP node back and clears its instance-data word. Null is allowed.
-    Codes: none. */
+    Codes: ErrInternal (the word holds something else than counters, and stays as it is). */
 QX_API ErrorCode MeasurementUnreserveProc(QX_INOUT MeasurementInstanceWord *instance);
 
 /** Has no effect: the measurements need no preparation. */

@@ -72,7 +72,11 @@ typedef struct __attribute__((may_alias)) Array2DBlock {
 
 /* The host owns the blocks and may move one in any resize, so they are passed by handle: a pointer
    to the pointer to the block. Each element has a handle type of its own, so that the compiler
-   refuses an array of the wrong element. */
+   refuses an array of the wrong element.
+
+   An input may be an output of the same call, which gives the result of two arrays, records that
+   carry arrays included. Two outputs may not be one array: ErrInternal, whatever the export, before
+   anything else is looked at. A block that says a negative size is an empty array. */
 #define QX_ARRAY_1D(element)                                                                       \
     struct __attribute__((may_alias)) QXArray1D_##element {                                        \
         int32_t dimSize;                                                                           \

@@ -4,6 +4,8 @@
 #include "frame/arrays.h"
 #include "qx/calculus.h"
 
+#include <algorithm>
+
 namespace qx {
 
 // The view of a block of three dimensions, In<DBL3D>; no other family has such blocks, and none is
@@ -16,7 +18,7 @@ class Block<Handle, 3> {
 public:
     typedef typename HandleTraits<Handle>::T T;
 
-    int32_t dimension(int which) const { return (*handle_)->dimSizes[which]; }
+    int32_t dimension(int which) const { return std::max((*handle_)->dimSizes[which], 0); }
 
 protected:
     typedef Array3DHandle AnyHandle;

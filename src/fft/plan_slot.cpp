@@ -1,8 +1,7 @@
 #include "fft/plan_slot.h"
 
 #include "frame/host_binding.h"
-
-#include <cstdlib>
+#include "frame/node_cell.h"
 
 namespace qx {
 namespace {
@@ -12,18 +11,15 @@ PlanCell *CellOf(PlanSlot slot) { return static_cast<PlanCell *>(slot); }
 void ReleaseSlot(PlanSlot *slot) {
     if (!*slot)
         return;
-    qx::destroy_oxfft_table(CellOf(*slot)->plan);
-    std::free(*slot);
+    CellSweep(*slot);
     *slot = nullptr;
 }
 
-// `Swept` tells whether the host sweeps the cell.
-template <bool Swept>
+template <CellKind Kind>
 ErrorCode Acquire(PlanSlot *slot, int32_t n) {
-    if (!*slot)
-        *slot = std::calloc(1, sizeof(PlanCell));
-    if (!*slot)
-        return ErrOutOfMemory;
+    constexpr bool isSwept = Kind == CellKind::Plan;
+    if (const ErrorCode failed = ReserveCell<PlanCell>(slot, Kind))
+        return failed;
     PlanCell *const cell = CellOf(*slot);
     if (cell->plan && cell->plan->length == n)
         return 0;
@@ -32,46 +28,49 @@ ErrorCode Acquire(PlanSlot *slot, int32_t n) {
     qx::destroy_oxfft_table(cell->plan);
     cell->plan = qx::create_oxfft_table(n);
     // A plan that nobody would sweep is none.
-    if (cell->plan && Swept && isNew &&
+    if (cell->plan && isSwept && isNew &&
         HostRegisterSweep(CellSweep, cell, SweepForObject) != 0) {
         qx::destroy_oxfft_table(cell->plan);
         cell->plan = nullptr;
     }
     if (cell->plan)
         return 0;
-    if (Swept && !isNew)
+    if (isSwept && !isNew)
         HostRegisterSweep(CellSweep, cell, SweepWithdraw);
-    std::free(cell);
+    FreeCell(cell);
     *slot = nullptr;
     return ErrOutOfMemory;
 }
 
 } // namespace
 
-ErrorCode PlanSlotAcquire(PlanSlot *slot, int32_t n) { return Acquire<true>(slot, n); }
+ErrorCode PlanSlotAcquire(PlanSlot *slot, int32_t n) { return Acquire<CellKind::Plan>(slot, n); }
 
-ErrorCode PlanSlotAcquireIDP(PlanSlot *slot, int32_t n) { return Acquire<false>(slot, n); }
+ErrorCode PlanSlotAcquireIDP(PlanSlot *slot, int32_t n) {
+    return Acquire<CellKind::PlanOfInstance>(slot, n);
+}
 
 int32_t CellSweep(void *cell) {
     qx::destroy_oxfft_table(CellOf(cell)->plan);
-    std::free(cell);
+    FreeCell(cell);
     return 0;
 }
 
 ErrorCode TransformInstanceReserve(InstanceWord *word) {
-    if (!*word)
-        *word = std::calloc(1, sizeof(TransformInstance));
-    return *word ? 0 : ErrOutOfMemory;
+    return ReserveCell<TransformInstance>(word, CellKind::TransformInstance);
 }
 
-void TransformInstanceRelease(InstanceWord *word) {
+ErrorCode TransformInstanceRelease(InstanceWord *word) {
     if (!word || !*word)
-        return;
+        return 0;
+    if (!IsCell(*word, CellKind::TransformInstance))
+        return ErrInternal;
     auto *const instance = static_cast<TransformInstance *>(*word);
     ReleaseSlot(&instance->first);
     ReleaseSlot(&instance->second);
-    std::free(instance);
+    FreeCell(instance);
     *word = nullptr;
+    return 0;
 }
 
 } // namespace qx

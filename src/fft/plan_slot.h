@@ -23,7 +23,8 @@ struct TransformInstance {
 };
 
 // Makes the slot hold a plan of length n. A plan of that length that is there already is left
-// as it is, without a look into the plan cache. 0 or ErrOutOfMemory, with the slot then null.
+// as it is, without a look into the plan cache. 0; ErrInternal for a slot that holds something else,
+// which stays; ErrOutOfMemory, with the slot then null.
 //
 // The first form registers a sweep for the cell with the host; the IDP form registers nothing,
 // because the host gives instance data back through TransformUnreserveProc.
@@ -34,9 +35,11 @@ ErrorCode PlanSlotAcquireIDP(PlanSlot *slot, int32_t n);
 // The slot belongs to the object that the host is discarding and is not touched.
 int32_t CellSweep(void *cell);
 
-// Makes an instance where the word is null. 0 or ErrOutOfMemory.
+// Makes an instance where the word is null. 0, ErrInternal for a word that holds something else,
+// ErrOutOfMemory.
 ErrorCode TransformInstanceReserve(InstanceWord *word);
-void TransformInstanceRelease(InstanceWord *word);
+// 0, or ErrInternal for a word that holds something else, which stays.
+ErrorCode TransformInstanceRelease(InstanceWord *word);
 
 inline bool IsPlanLength(int64_t n) { return n <= std::numeric_limits<int32_t>::max(); }
 
@@ -54,7 +57,12 @@ public:
     explicit KeepInSlots(PlanSlot *first, PlanSlot *second = nullptr)
         : first_(first), second_(second) {}
     ErrorCode acquire(int64_t n) const { return acquire(first_, n); }
-    ErrorCode acquireSecond(int64_t n) const { return acquire(second_, n); }
+    // One slot given twice holds one plan.
+    ErrorCode acquireSecond(int64_t n) const {
+        if (second_ == first_ && plan()->length != n)
+            return ErrInternal;
+        return acquire(second_, n);
+    }
     const FFTPlan *plan() const { return HeldPlan(first_); }
     const FFTPlan *secondPlan() const { return HeldPlan(second_); }
 

@@ -6,8 +6,10 @@
 #include "frame/outcome.h"
 #include "frame/scratch.h"
 
+#include <algorithm>
 #include <cstring>
 #include <limits>
+#include <tuple>
 #include <type_traits>
 
 namespace qx {
@@ -16,6 +18,9 @@ namespace qx {
 // Out<CDB2D>, InOut<DBL1D>. The element follows from the handle, so a view of another element does
 // not compile. They read the block through the handle at every use, so that no pointer outlives a
 // resize. Handles are never null and are not tested.
+//
+// A block that says a negative size is an empty array to everybody: size(), rows() and cols() are
+// never below 0. Where such a block has a code of its own, the body asks hasNegativeSize().
 
 // The element and the number of dimensions of a handle type.
 template <class Handle>
@@ -65,16 +70,16 @@ class Block<Handle, 1> {
 public:
     typedef typename HandleTraits<Handle>::T T;
 
-    int32_t size() const { return (*handle_)->dimSize; }
+    int32_t size() const { return std::max((*handle_)->dimSize, 0); }
     bool isEmpty() const { return size() < 1; }
+    bool hasNegativeSize() const { return (*handle_)->dimSize < 0; }
 
 protected:
     typedef Array1DHandle AnyHandle;
     explicit Block(AnyHandle handle) : handle_(handle) {}
     T *elements() const { return reinterpret_cast<T *>(&(*handle_)[1]); }
     std::size_t bytes() const {
-        return sizeof(Array1DBlock) +
-               (isEmpty() ? 0 : sizeof(T) * static_cast<std::size_t>(size()));
+        return sizeof(Array1DBlock) + sizeof(T) * static_cast<std::size_t>(size());
     }
     AnyHandle handle_;
 };
@@ -84,19 +89,21 @@ class Block<Handle, 2> {
 public:
     typedef typename HandleTraits<Handle>::T T;
 
-    int32_t rows() const { return (*handle_)->dimSizes[0]; }
-    int32_t cols() const { return (*handle_)->dimSizes[1]; }
+    int32_t rows() const { return std::max((*handle_)->dimSizes[0], 0); }
+    int32_t cols() const { return std::max((*handle_)->dimSizes[1], 0); }
     bool isEmpty() const { return rows() < 1 || cols() < 1; }
     bool isSquare() const { return rows() == cols(); }
+    bool hasNegativeSize() const {
+        return (*handle_)->dimSizes[0] < 0 || (*handle_)->dimSizes[1] < 0;
+    }
 
 protected:
     typedef Array2DHandle AnyHandle;
     explicit Block(AnyHandle handle) : handle_(handle) {}
     T *elements() const { return reinterpret_cast<T *>(&(*handle_)[1]); }
     std::size_t bytes() const {
-        return sizeof(Array2DBlock) + (isEmpty() ? 0
-                                                 : sizeof(T) * static_cast<std::size_t>(rows()) *
-                                                       static_cast<std::size_t>(cols()));
+        return sizeof(Array2DBlock) +
+               sizeof(T) * static_cast<std::size_t>(rows()) * static_cast<std::size_t>(cols());
     }
     AnyHandle handle_;
 };
@@ -111,6 +118,7 @@ public:
     const typename Base::T *data() const { return this->elements(); }
 
     // For the frame: an input that is an output of the same call reads a copy from here on.
+    auto inputs() { return std::tie(*this); }
     const void *identity() const { return this->handle_; }
     ErrorCode readCopyIn(ScratchBytes &memory, void *&block) {
         // Scratch memory starts at any byte, the sizes of a block do not.
@@ -195,6 +203,8 @@ public:
             empty();
     }
 
+    // For the frame.
+    auto outputs() const { return std::tuple(identity()); }
     const void *identity() const { return this->handle_; }
 
 private:

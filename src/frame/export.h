@@ -3,6 +3,7 @@
 
 #include "frame/arrays.h"
 
+#include <array>
 #include <tuple>
 #include <utility>
 
@@ -24,8 +25,12 @@ namespace qx {
 //   - a failure settles every output (Out, InOut, OutDBL ...), in the order of the parameters,
 //     whether the body reached it or not: arrays are emptied, scalars become NaN. Warnings and
 //     success leave them.
+//   - two outputs that are one array are refused with ErrInternal, before the body runs.
 //   - an In or Spoiled whose array is also an Out of the call reads a copy, so that a host that
 //     works in place gets the result of separate arrays.
+//   - a record of the caller's that carries arrays is a class which names those that are inputs by
+//     inputs(), a tuple of references to its views, and the others by outputs(), a tuple of what
+//     their identity() gives.
 //   - everything else (numbers, plain pointers, plan keepers) is handed on as it is.
 // A body is a function or a lambda whose parameters have their types written out; it returns an
 // Outcome or an ErrorCode. What a twin does differently is a template argument of its body, or a
@@ -34,32 +39,40 @@ namespace qx {
 namespace detail {
 
 template <class Parameter>
-struct ParameterKind {
-    static constexpr bool isInput = false;
-    static constexpr bool isOutputArray = false;
-    static constexpr bool isOutput = requires(Parameter parameter) { parameter.settleFailure(); };
-};
-template <class Handle>
-struct ParameterKind<In<Handle>> {
-    static constexpr bool isInput = true;
-    static constexpr bool isOutputArray = false;
-    static constexpr bool isOutput = false;
-};
-template <class Handle>
-struct ParameterKind<Spoiled<Handle>> : ParameterKind<In<Handle>> {};
-template <class Handle, OnFailure Failure, ElementType EmptyCode>
-struct ParameterKind<Out<Handle, Failure, EmptyCode>> {
-    static constexpr bool isInput = false;
-    static constexpr bool isOutputArray = true;
-    static constexpr bool isOutput = true;
-};
+concept SettlesFailure = requires(Parameter parameter) { parameter.settleFailure(); };
+template <class Parameter>
+concept HasInputs = requires(Parameter parameter) { parameter.inputs(); };
+template <class Parameter>
+concept HasOutputs = requires(Parameter parameter) { parameter.outputs(); };
 
-struct NoCopy {};
 // Where an input that is also an output has its copy.
 struct Copy {
     ScratchBytes memory;
     void *block = nullptr;
 };
+
+// The inputs of a parameter, as references to views.
+template <class Parameter>
+auto InputsOf(Parameter &parameter) {
+    if constexpr (HasInputs<Parameter>)
+        return parameter.inputs();
+    else
+        return std::tuple<>();
+}
+// Its outputs, by what tells one array from another.
+template <class Parameter>
+auto OutputsOf(const Parameter &parameter) {
+    if constexpr (HasOutputs<Parameter>)
+        return parameter.outputs();
+    else
+        return std::tuple<>();
+}
+template <class Parameter>
+constexpr std::size_t inputCount =
+    std::tuple_size_v<decltype(InputsOf(std::declval<Parameter &>()))>;
+template <class Parameter>
+constexpr std::size_t outputCount =
+    std::tuple_size_v<decltype(OutputsOf(std::declval<Parameter &>()))>;
 
 template <class... Parameters>
 class Frame {
@@ -70,8 +83,9 @@ public:
 
     template <class Body>
     Outcome run(Body body) {
-        if (const Outcome bad = separateInputs(std::index_sequence_for<Parameters...>()))
-            return bad;
+        if constexpr (outputs > 1 || (inputs > 0 && outputs > 0))
+            if (const ErrorCode bad = separate())
+                return bad;
         return std::apply(body, parameters_);
     }
 
@@ -80,48 +94,54 @@ public:
     }
 
 private:
-    static constexpr bool hasInput = (ParameterKind<Parameters>::isInput || ...);
-    static constexpr bool hasOutput = (ParameterKind<Parameters>::isOutputArray || ...);
+    static constexpr std::size_t inputs = (inputCount<Parameters> + ... + 0);
+    static constexpr std::size_t outputs = (outputCount<Parameters> + ... + 0);
+    typedef std::array<const void *, outputs> Identities;
 
     template <class Parameter>
     static void settle(Parameter &parameter) {
-        if constexpr (ParameterKind<Parameter>::isOutput)
+        if constexpr (SettlesFailure<Parameter>)
             parameter.settleFailure();
     }
 
-    template <std::size_t... I>
-    ErrorCode separateInputs(std::index_sequence<I...>) {
-        ErrorCode status = 0;
-        if constexpr (hasInput && hasOutput)
-            (void)(((status = separate<I>()) != 0) || ...);
-        return status;
-    }
-    template <std::size_t I>
-    ErrorCode separate() {
-        auto &parameter = std::get<I>(parameters_);
-        if constexpr (ParameterKind<std::decay_t<decltype(parameter)>>::isInput) {
-            if (isOutputToo(parameter.identity()))
-                return parameter.readCopyIn(std::get<I>(copies_).memory,
-                                            std::get<I>(copies_).block);
-        }
-        return 0;
-    }
-    bool isOutputToo(const void *identity) {
-        return std::apply(
-            [identity](auto &...parameter) { return (isOutput(parameter, identity) || ...); },
+    Identities identitiesOfOutputs() const {
+        const auto all = std::apply(
+            [](auto &...parameter) { return std::tuple_cat(OutputsOf(parameter)...); },
             parameters_);
+        return std::apply([](auto... identity) { return Identities{identity...}; }, all);
     }
-    template <class Parameter>
-    static bool isOutput(Parameter &parameter, const void *identity) {
-        if constexpr (ParameterKind<Parameter>::isOutputArray)
-            return parameter.identity() == identity;
-        else
-            return false;
+    // A record may carry no array where none is needed.
+    template <std::size_t... I>
+    static bool isAmong(const void *identity, const Identities &all, std::index_sequence<I...>) {
+        return ((all[I] == identity) || ...) && identity != nullptr;
+    }
+    template <std::size_t... I>
+    static bool twoAreOne(const Identities &all, std::index_sequence<I...>) {
+        return (isAmong(all[I], all, std::make_index_sequence<I>()) || ...);
+    }
+
+    ErrorCode separate() {
+        constexpr std::make_index_sequence<outputs> everyOutput;
+        const Identities all = identitiesOfOutputs();
+        if (twoAreOne(all, everyOutput))
+            return ErrInternal;
+        ErrorCode status = 0;
+        std::size_t at = 0;
+        const auto copyIfMet = [&](auto &input) {
+            Copy &copy = copies_[at++];
+            if (isAmong(input.identity(), all, everyOutput))
+                status = input.readCopyIn(copy.memory, copy.block);
+            return status == 0;
+        };
+        std::apply([&](auto &...input) { (void)(copyIfMet(input) && ...); },
+                   std::apply(
+                       [](auto &...parameter) { return std::tuple_cat(InputsOf(parameter)...); },
+                       parameters_));
+        return status;
     }
 
     std::tuple<Parameters...> parameters_;
-    std::tuple<std::conditional_t<hasOutput && ParameterKind<Parameters>::isInput, Copy, NoCopy>...>
-        copies_;
+    std::array<Copy, outputs == 0 ? 0 : inputs> copies_;
 };
 
 // The frame of a body: its parameters are those of the function or the lambda.

@@ -48,7 +48,10 @@ inline ErrorCode Merge(ErrorCode status, ErrorCode cleanUp) {
 class ScratchBytes {
 public:
     ScratchBytes() = default;
-    ~ScratchBytes() { ScratchFree(block_); }
+    ~ScratchBytes() {
+        if (block_ != nullptr)
+            ScratchFree(block_);
+    }
     ScratchBytes(ScratchBytes &&other) noexcept : block_(std::exchange(other.block_, nullptr)) {}
     ScratchBytes &operator=(ScratchBytes &&other) noexcept {
         void *const taken = std::exchange(other.block_, nullptr);

@@ -1,6 +1,7 @@
 #include "measure/histogram_slot.h"
 
 #include "frame/host_binding.h"
+#include "frame/node_cell.h"
 
 #include <cstdlib>
 #include <limits>
@@ -14,7 +15,7 @@ MeasurementHistogram *HeldBy(void *word) { return static_cast<MeasurementHistogr
 // The sweep of a block: the word that held it belongs to what the host is discarding.
 int32_t HistogramSweep(void *block) {
     std::free(HeldBy(block)->counts);
-    std::free(block);
+    FreeCell(block);
     return 0;
 }
 
@@ -35,6 +36,8 @@ ErrorCode Resize(MeasurementHistogram *histogram, int32_t bins) {
 } // namespace
 
 ErrorCode KeepHistogramInSlot::acquire(int32_t bins) const {
+    if (*word_ != nullptr && !IsCell(*word_, CellKind::Histogram))
+        return ErrInternal;
     if (*word_ != nullptr && HeldBy(*word_)->bins == bins)
         return 0;
     if (*word_ != nullptr) {
@@ -42,12 +45,11 @@ ErrorCode KeepHistogramInSlot::acquire(int32_t bins) const {
         HistogramSweep(*word_);
         *word_ = nullptr;
     }
-    void *const block = std::calloc(1, sizeof(MeasurementHistogram));
+    auto *const block = NewCell<MeasurementHistogram>(CellKind::Histogram);
     if (block == nullptr)
         return ErrOutOfMemory;
     // A block that nobody would sweep is none.
-    if (Resize(HeldBy(block), bins) != 0 ||
-        HostRegisterSweep(HistogramSweep, block, SweepForObject) != 0) {
+    if (Resize(block, bins) != 0 || HostRegisterSweep(HistogramSweep, block, SweepForObject) != 0) {
         HistogramSweep(block);
         return ErrOutOfMemory;
     }
@@ -56,16 +58,20 @@ ErrorCode KeepHistogramInSlot::acquire(int32_t bins) const {
 }
 
 ErrorCode KeepHistogramInInstance::acquire(int32_t bins) const {
-    if (*word_ == nullptr)
-        *word_ = std::calloc(1, sizeof(MeasurementHistogram));
-    return *word_ == nullptr ? ErrOutOfMemory : Resize(HeldBy(*word_), bins);
+    if (const ErrorCode failed =
+            ReserveCell<MeasurementHistogram>(word_, CellKind::HistogramInstance))
+        return failed;
+    return Resize(HeldBy(*word_), bins);
 }
 
-void MeasurementInstanceRelease(MeasurementInstanceWord *word) {
+ErrorCode MeasurementInstanceRelease(MeasurementInstanceWord *word) {
     if (word == nullptr || *word == nullptr)
-        return;
+        return 0;
+    if (!IsCell(*word, CellKind::HistogramInstance))
+        return ErrInternal;
     HistogramSweep(*word);
     *word = nullptr;
+    return 0;
 }
 
 } // namespace qx

@@ -15,7 +15,8 @@ struct MeasurementHistogram {
 };
 
 // The two ways to keep them; a plain export and its _IDP twin differ in nothing else. `acquire`
-// makes the word hold so many counters, of any content: 0 or ErrOutOfMemory.
+// makes the word hold so many counters, of any content: 0, ErrInternal for a word that holds
+// something else, which stays, or ErrOutOfMemory.
 
 // In a word that the caller owns, swept by the host. A change of the number replaces the block.
 class KeepHistogramInSlot {
@@ -41,7 +42,8 @@ private:
     MeasurementInstanceWord *word_;
 };
 
-void MeasurementInstanceRelease(MeasurementInstanceWord *word);
+// 0, or ErrInternal for a word that holds something else, which stays.
+ErrorCode MeasurementInstanceRelease(MeasurementInstanceWord *word);
 
 } // namespace qx
 

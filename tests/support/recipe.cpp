@@ -64,6 +64,8 @@ const char *ElementName(ElementType element) {
 
 } // namespace
 
+void Call::Array::remember() { before.assign(block(), block() + blockSize()); }
+
 bool Call::Array::isUnchanged() const {
     return blockSize() == before.size() && std::memcmp(block(), before.data(), before.size()) == 0;
 }
@@ -78,11 +80,34 @@ int32_t Call::sizeOf(int number, int dimension, int32_t asked) const {
     return isAltered ? altered_.size : asked;
 }
 
-void Call::addInput(Role role, int number, std::unique_ptr<Array> array) {
+std::unique_ptr<Call::Array> *Call::find(const Place &place) {
+    Arrays &arrays = place.isOutput ? outputs_ : inputs_;
+    const auto found = arrays.find(place.number);
+    return found == arrays.end() ? nullptr : &found->second;
+}
+
+std::unique_ptr<Call::Array> *Call::partnerOf(const Place &place) {
+    if (sharing_ == Sharing::None || !(place == shared_.first || place == shared_.second))
+        return nullptr;
+    return find(place == shared_.first ? shared_.second : shared_.first);
+}
+
+Call::Array &Call::add(Role role, const Place &place, std::unique_ptr<Array> array) {
     array->role = role;
-    array->before.assign(array->block(), array->block() + array->blockSize());
-    if (!inputs_.emplace(number, std::move(array)).second)
-        throw std::logic_error("a recipe with two inputs of number " + std::to_string(number));
+    if (!place.isOutput) {
+        if (place.number == claimed_.input)
+            for (std::size_t i = 0; i < array->sizes().size(); ++i)
+                if (claimed_.dimension == all || claimed_.dimension == static_cast<int>(i))
+                    std::memcpy(const_cast<unsigned char *>(array->block()) + 4 * i,
+                                &claimed_.size, sizeof claimed_.size);
+        array->remember();
+        if (find(place) != nullptr)
+            throw std::logic_error("a recipe with two inputs of number " +
+                                   std::to_string(place.number));
+    }
+    std::unique_ptr<Array> &held = (place.isOutput ? outputs_ : inputs_)[place.number];
+    held = std::move(array);
+    return *held;
 }
 
 void *Call::makeRecords(int number, int32_t count, const void *records, std::size_t bytes) {
@@ -99,7 +124,7 @@ void *Call::makeRecords(int number, int32_t count, const void *records, std::siz
     const U8_1D handle = array->array.handle();
     (*handle)->dimSize = stored;
     array->isRecords = true;
-    addInput(Role::Input, number, std::move(array));
+    add(Role::Input, {false, number}, std::move(array));
     return handle;
 }
 
@@ -120,7 +145,16 @@ int32_t *Call::integer(int number) {
 
 void **Call::slot(int number) {
     const HeapProbe::Pause pause;
-    return &slots_[number];
+    return &slots_.emplace(number, preset_).first->second;
+}
+
+std::vector<void *> Call::words() const {
+    std::vector<void *> found;
+    for (const auto &[number, slot] : slots_)
+        found.push_back(slot);
+    if (releaseInstance_ != nullptr)
+        found.push_back(instance_);
+    return found;
 }
 
 const int32_t *Call::byReference(int32_t value) {
@@ -157,17 +191,31 @@ std::vector<Call::Size> Call::inputSizes() const {
     return found;
 }
 
-std::vector<Call::Pair> Call::pairsOfOneType() const {
-    std::vector<Pair> found;
-    for (const auto &[input, in] : inputs_) {
-        const bool isArgument =
-            !in->isRecords &&
-            std::find(insideRecord_.begin(), insideRecord_.end(), input) == insideRecord_.end();
-        for (const auto &[output, out] : outputs_)
-            if (isArgument && in->role == Role::Input && in->element() == out->element() &&
-                in->sizes().size() == out->sizes().size())
-                found.push_back({input, output});
-    }
+Call::Meeting Call::meetingOf(const Array &first, const Array &second) {
+    const auto is = [&](Role role) { return first.role == role || second.role == role; };
+    if (first.role == Role::Input && second.role == Role::Input)
+        return Meeting::ReadTwice;
+    if (is(Role::Input))
+        return Meeting::ReadAndWritten;
+    return is(Role::Spoiled) ? Meeting::Unknown : Meeting::WrittenTwice;
+}
+
+std::vector<std::pair<Call::Pair, Call::Meeting>> Call::pairsOfOneType() const {
+    std::vector<std::pair<Place, const Array *>> places;
+    for (const auto &[number, array] : inputs_)
+        if (!array->isRecords &&
+            std::find(readAgain_.begin(), readAgain_.end(), number) == readAgain_.end())
+            places.push_back({{false, number}, array.get()});
+    for (const auto &[number, array] : outputs_)
+        places.push_back({{true, number}, array.get()});
+    std::vector<std::pair<Pair, Meeting>> found;
+    for (std::size_t i = 0; i < places.size(); ++i)
+        for (std::size_t j = 0; j < i; ++j) {
+            const Array &first = *places[j].second, &second = *places[i].second;
+            if (first.element() == second.element() &&
+                first.sizes().size() == second.sizes().size())
+                found.push_back({{places[j].first, places[i].first}, meetingOf(first, second)});
+        }
     return found;
 }
 
@@ -212,7 +260,7 @@ uint64_t Call::outputHash(ErrorCode status) const {
     hash.add(&status, sizeof status);
     for (const Arrays *arrays : {&inputs_, &outputs_})
         for (const auto &[number, array] : *arrays) {
-            if (array->role == Role::Input)
+            if (array->role == Role::Input || !array->isCounted)
                 continue;
             const std::size_t header = array->headerSize();
             hash.add(array->block(), header);
@@ -285,8 +333,9 @@ std::string Call::describeOutputs() const {
 
 void Call::releaseNodes() {
     for (auto &[number, slot] : slots_)
-        RunSweepOf(std::exchange(slot, nullptr));
-    if (instance_ != nullptr)
+        if (slot != preset_)
+            RunSweepOf(std::exchange(slot, nullptr));
+    if (instance_ != preset_)
         releaseInstance_(&instance_);
 }
 

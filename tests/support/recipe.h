@@ -152,10 +152,10 @@ public:
         mayBeEmpty_.push_back(number);
     }
 
-    // An input that travels inside a record, so that no frame sees it beside an output.
-    void insideRecord(int number) {
+    // An input that the recipe hands over in more than one call: it cannot be an output as well.
+    void isReadAgain(int number) {
         const HeapProbe::Pause pause;
-        insideRecord_.push_back(number);
+        readAgain_.push_back(number);
     }
 
     // Scalar outputs: a failure leaves the quiet NaN, in both parts of a complex one, or for
@@ -192,6 +192,7 @@ public:
     void **slot(int number);
     void **instance(int32_t (*release)(void **)) {
         releaseInstance_ = release;
+        instance_ = preset_;
         return &instance_;
     }
 
@@ -206,17 +207,38 @@ public:
     };
     std::vector<Size> inputSizes() const;
     void alter(int input, int dimension, int32_t size) { altered_ = {input, dimension, size}; }
+    // Lets the block of an input say a size that it does not have.
+    static constexpr int all = -1;
+    void claim(int input, int dimension, int32_t size) { claimed_ = {input, dimension, size}; }
+    // Lets every word hold something from the start, of which nobody but the caller disposes.
+    void preset(void *word) { preset_ = word; }
+    // What the words hold after the call.
+    std::vector<void *> words() const;
     // Called with each array that the recipe has filled: what it changes is what the export gets.
     typedef std::function<void(unsigned char *elements, ElementType, int32_t rows, int32_t cols)>
         Spoil;
     void spoil(Spoil spoil) { spoil_ = std::move(spoil); }
-    // One array as the input and the output of these numbers: pairs of equal handle types.
-    struct Pair {
-        int input;
-        int output;
+    // One array in two places of the call. What is read of it is what the recipe gives; where both
+    // are read, what it gives last.
+    struct Place {
+        bool isOutput; // a number in the row of outputs
+        int number;
+        bool operator==(const Place &) const = default;
     };
-    std::vector<Pair> pairsOfOneType() const;
-    void share(Pair pair) { shared_ = pair; }
+    struct Pair {
+        Place first, second;
+    };
+    enum class Meeting {
+        ReadTwice,     // two inputs
+        ReadAndWritten, // an input and an output
+        WrittenTwice,  // two outputs
+        Unknown        // one of them is written by the way
+    };
+    std::vector<std::pair<Pair, Meeting>> pairsOfOneType() const;
+    void share(const Pair &pair) { shared_ = pair, sharing_ = Sharing::OneArray; }
+    // Two arrays of that content in its stead, of which the second one counts.
+    void keepApart(const Pair &pair) { shared_ = pair, sharing_ = Sharing::TwoArrays; }
+    bool sharesArray() const { return sharing_ == Sharing::OneArray; }
     bool sizesFitBlocks() const;
     bool inputsAreUnchanged() const;
     // After a failure: arrays without elements, scalars NaN or 0, kept arrays as they were.
@@ -229,7 +251,7 @@ public:
     ~Call() { releaseNodes(); }
 
 private:
-    enum class Role { Input, InOut, Kept, Spoiled, Output };
+    enum class Role { Input, Spoiled, Kept, InOut, Output };
     struct Array {
         virtual ~Array() = default;
         virtual const unsigned char *block() const = 0; // sizes and elements
@@ -237,12 +259,17 @@ private:
         virtual std::size_t blockSize() const = 0;
         virtual std::vector<int32_t> sizes() const = 0;
         virtual ElementType element() const = 0;
+        void remember(); // the content at the start
         bool isUnchanged() const;
         bool isEmpty() const; // all its sizes are 0
         std::size_t headerSize() const { return 4 * sizes().size(); }
 
+        // Of two arrays in one's stead that which is written more counts.
+        int rank() const { return role == Role::Output ? 3 : static_cast<int>(role); }
+
         Role role = Role::Output;
         bool isRecords = false;
+        bool isCounted = true; // in the result
         std::vector<unsigned char> before; // content at the start, for inputs
     };
     template <ElementType Code>
@@ -264,11 +291,15 @@ private:
     Handle2D<Code> make(Role role, int number, int32_t rows, int32_t cols, const Values &values);
     void *makeRecords(int number, int32_t count, const void *records, std::size_t bytes);
     int32_t sizeOf(int number, int dimension, int32_t asked) const;
-    void addInput(Role role, int number, std::unique_ptr<Array> array);
-    template <class Made, class... Sizes>
-    Made &sharedOutput(Sizes... sizes);
+    static Meeting meetingOf(const Array &first, const Array &second);
+    Array &add(Role role, const Place &place, std::unique_ptr<Array> array);
+    template <class Made, class FillIn>
+    Made &addOrShare(Role role, const Place &place, std::unique_ptr<Made> array,
+                     const FillIn &fillIn);
     template <class Made, class... Sizes>
     Made &addOutput(int number, Sizes... sizes);
+    std::unique_ptr<Array> *find(const Place &place);
+    std::unique_ptr<Array> *partnerOf(const Place &place);
 
     Arrays inputs_, outputs_;
     std::map<int, double> scalars_;
@@ -276,15 +307,17 @@ private:
     std::map<int, int32_t> integers_;
     std::map<int, std::vector<unsigned char>> records_, recordsWithHandles_;
     std::map<int, void *> slots_;
-    void *instance_ = nullptr;
+    void *instance_ = nullptr, *preset_ = nullptr;
     int32_t (*releaseInstance_)(void **) = nullptr;
     std::vector<std::unique_ptr<int32_t>> int32Values_;
     std::vector<std::unique_ptr<double>> doubleValues_;
-    std::vector<int> mayBeEmpty_, insideRecord_;
+    std::vector<int> mayBeEmpty_, readAgain_;
     ErrorCode error_ = 0;
     bool hasError_ = false;
-    Alteration altered_ = {-1, 0, 0};
-    Pair shared_ = {-1, -1};
+    Alteration altered_ = {-1, 0, 0}, claimed_ = {-1, 0, 0};
+    enum class Sharing { None, OneArray, TwoArrays };
+    Sharing sharing_ = Sharing::None;
+    Pair shared_ = {};
     Spoil spoil_;
 };
 

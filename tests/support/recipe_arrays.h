@@ -3,6 +3,7 @@
 
 #include "tests/support/heap_probe.h"
 
+#include <algorithm>
 #include <type_traits>
 
 // The templates of Call; included by recipe.h.
@@ -69,7 +70,8 @@ struct Call::Array1 : Call::Array {
     }
     std::size_t room() const override { return detail::BlockSize(array.handle()); }
     std::size_t blockSize() const override {
-        return 4 + static_cast<std::size_t>(array.size()) * sizeof(typename Element<Code>::type);
+        return 4 + static_cast<std::size_t>(std::max(array.size(), 0)) *
+                       sizeof(typename Element<Code>::type);
     }
     std::vector<int32_t> sizes() const override { return {array.size()}; }
     ElementType element() const override { return Code; }
@@ -84,29 +86,46 @@ struct Call::Array2 : Call::Array {
     }
     std::size_t room() const override { return detail::BlockSize(array.handle()); }
     std::size_t blockSize() const override {
-        return 8 + static_cast<std::size_t>(array.size()) * sizeof(typename Element<Code>::type);
+        return 8 + static_cast<std::size_t>(std::max(array.rows(), 0)) *
+                       static_cast<std::size_t>(std::max(array.cols(), 0)) *
+                       sizeof(typename Element<Code>::type);
     }
     std::vector<int32_t> sizes() const override { return {array.rows(), array.cols()}; }
     ElementType element() const override { return Code; }
 };
 
-// The output that is shared with an input, in whichever order the two are asked for.
-template <class Made, class... Sizes>
-Made &Call::sharedOutput(Sizes... sizes) {
-    auto &held = outputs_[shared_.output];
-    if (!held)
-        held = std::make_unique<Made>(sizes...);
-    else
-        dynamic_cast<Made &>(*held).array.resize(sizes...);
-    return dynamic_cast<Made &>(*held);
+// Adds an array, or lets it be one with its partner that stands already. fillIn(array) sizes it and
+// writes what is read of it.
+template <class Made, class FillIn>
+Made &Call::addOrShare(Role role, const Place &place, std::unique_ptr<Made> made,
+                       const FillIn &fillIn) {
+    std::unique_ptr<Array> *const held = partnerOf(place);
+    if (held == nullptr)
+        return static_cast<Made &>(add(role, place, std::move(made)));
+    auto &partner = dynamic_cast<Made &>(**held);
+    if (role != Role::Output) {
+        fillIn(partner);
+        partner.remember();
+    }
+    made->role = role;
+    const bool isMore = made->rank() > partner.rank();
+    if (sharing_ == Sharing::TwoArrays) {
+        (isMore ? partner.isCounted : made->isCounted) = false;
+        return static_cast<Made &>(add(role, place, std::move(made)));
+    }
+    if (!isMore)
+        return partner;
+    // The shared array stands where it is written more.
+    std::unique_ptr<Array> moved = std::move(*held);
+    const Place &from = place == shared_.first ? shared_.second : shared_.first;
+    (from.isOutput ? outputs_ : inputs_).erase(from.number);
+    return static_cast<Made &>(add(role, place, std::move(moved)));
 }
 
 template <class Made, class... Sizes>
 Made &Call::addOutput(int number, Sizes... sizes) {
-    auto &held = outputs_[number];
-    if (!held || number != shared_.output)
-        held = std::make_unique<Made>(sizes...);
-    return dynamic_cast<Made &>(*held);
+    return addOrShare(Role::Output, {true, number}, std::make_unique<Made>(sizes...),
+                      [](Made &) {});
 }
 
 template <class Made>
@@ -119,17 +138,15 @@ template <ElementType Code, class Values>
 Handle1D<Code> Call::make(Role role, int number, int32_t count, const Values &values) {
     const HeapProbe::Pause pause;
     const int32_t size = sizeOf(number, 0, count);
-    if (role == Role::Input && number == shared_.input) {
-        auto &array = sharedOutput<Array1<Code>>(size).array;
-        detail::Fill(array.data(), array.size(), 1, number, values);
-        return array.handle();
-    }
+    const auto fillIn = [&](Array1<Code> &made) {
+        if (made.array.size() != size)
+            made.array.resize(size);
+        detail::Fill(made.array.data(), size, 1, number, values);
+        spoilIfAsked(made, 1, size);
+    };
     auto array = std::make_unique<Array1<Code>>(size);
-    detail::Fill(array->array.data(), array->array.size(), 1, number, values);
-    spoilIfAsked(*array, 1, size);
-    const Handle1D<Code> handle = array->array.handle();
-    addInput(role, number, std::move(array));
-    return handle;
+    fillIn(*array);
+    return addOrShare(role, {false, number}, std::move(array), fillIn).array.handle();
 }
 
 template <ElementType Code, class Values>
@@ -137,17 +154,15 @@ Handle2D<Code> Call::make(Role role, int number, int32_t rows, int32_t cols, con
     const HeapProbe::Pause pause;
     const int32_t first = sizeOf(number, 0, rows);
     const int32_t second = sizeOf(number, 1, cols);
-    if (role == Role::Input && number == shared_.input) {
-        auto &array = sharedOutput<Array2<Code>>(first, second).array;
-        detail::Fill(array.data(), array.size(), array.cols(), number, values);
-        return array.handle();
-    }
+    const auto fillIn = [&](Array2<Code> &made) {
+        if (made.array.rows() != first || made.array.cols() != second)
+            made.array.resize(first, second);
+        detail::Fill(made.array.data(), made.array.size(), second, number, values);
+        spoilIfAsked(made, first, second);
+    };
     auto array = std::make_unique<Array2<Code>>(first, second);
-    detail::Fill(array->array.data(), array->array.size(), array->array.cols(), number, values);
-    spoilIfAsked(*array, first, second);
-    const Handle2D<Code> handle = array->array.handle();
-    addInput(role, number, std::move(array));
-    return handle;
+    fillIn(*array);
+    return addOrShare(role, {false, number}, std::move(array), fillIn).array.handle();
 }
 
 template <ElementType Code>

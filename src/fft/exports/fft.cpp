@@ -211,8 +211,7 @@ ErrorCode InvReOXFFTHCH_IDP(DBL1D in, DBL1D out, InstanceWord *instance) {
 }
 
 ErrorCode TransformUnreserveProc(InstanceWord *instance) {
-    qx::TransformInstanceRelease(instance);
-    return 0;
+    return qx::TransformInstanceRelease(instance);
 }
 
 FFTPlan *create_oxfft_table(int32_t length) { return qx::create_oxfft_table(length); }

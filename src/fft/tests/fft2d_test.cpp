@@ -175,6 +175,19 @@ TEST(TwoDimensional, ChecksComeInOrder) {
         << "a negative start is found last of all, with the plans in their slots";
     EXPECT_EQ(static_cast<const qx::PlanCell *>(node.second)->plan->length, 2);
 
+    // One slot holds one plan, which is enough for a square.
+    DBLMatrix square(3, 3);
+    Fill(square);
+    CDBMatrix both(1, 1), apart(1, 1);
+    EXPECT_EQ(ReFFT2D_H(matrix.handle(), 0, 0, 2, 3, 0, both.handle(), &node.slot, &node.slot),
+              ErrInternal);
+    EXPECT_EQ(both.rows(), 0);
+    EXPECT_EQ(ReFFT2D_H(square.handle(), 0, 0, 3, 3, 0, both.handle(), &node.slot, &node.slot), 0);
+    EXPECT_EQ(ReFFT2D_H(square.handle(), 0, 0, 3, 3, 0, apart.handle(), &node.slot, &node.second),
+              0);
+    for (int32_t i = 0; i < 9; ++i)
+        EXPECT_EQ(both[i].re, apart[i].re);
+
     CDBMatrix noneComplex(3, 0), out(1, 1);
     DBLMatrix realOut(1, 1);
     EXPECT_EQ(CxInvFFT2D_H(noneComplex.handle(), 0, out.handle(), &node.slot, &node.second),

@@ -328,6 +328,12 @@ TEST(OneDimensional, InstanceDataIsSharedReleasedAndNeverSwept) {
     EXPECT_EQ(plan->refCount, 1);
     EXPECT_EQ(TransformUnreserveProc(&first), 0) << "a word of null";
     EXPECT_EQ(TransformUnreserveProc(nullptr), 0) << "and no word";
+    PlanSlot slot = nullptr;
+    ASSERT_EQ(CxOXFFTH(in.handle(), out.handle(), &slot), 0);
+    InstanceWord wrong = slot;
+    EXPECT_EQ(TransformUnreserveProc(&wrong), ErrInternal) << "no instance, but a slot's plan";
+    EXPECT_EQ(wrong, slot);
+    RunSweeps();
     EXPECT_EQ(TransformUnreserveProc(&second), 0);
 }
 

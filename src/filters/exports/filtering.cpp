@@ -74,12 +74,15 @@ ErrorCode RunDirect(Path path, const In<Coefficients> &a, const In<Coefficients>
     return F::iir(b.data(), b.size(), xState, a.data(), a.size(), yState, x, n, y);
 }
 
+// Where the second one is refused the first is cleared all the same.
 template <class XState, class YState>
 Outcome FitBoth(XState &xState, int32_t nb, YState &yState, int32_t na, bool clears) {
     if (const Outcome bad = Fit(xState, Memory(nb), clears))
         return bad;
-    if (const Outcome bad = Fit(yState, Memory(na), clears))
+    if (const Outcome bad = Fit(yState, Memory(na), clears)) {
+        Clear(xState);
         return bad;
+    }
     if (clears) {
         Clear(xState);
         Clear(yState);

@@ -70,6 +70,7 @@ public:
         model_.empty();
         interpolator_.empty();
     }
+    auto outputs() const { return std::tuple(model_.identity(), interpolator_.identity()); }
 
 private:
     static Outcome copy(const DBL *taps, int32_t count, Out<DBL1D> &array) {
@@ -89,6 +90,23 @@ Outcome Narrow(NarrowFIRGoal goal, OutDesign design) {
         return failed;
     return design.take(block);
 }
+
+// The same record as an input.
+class InDesign {
+public:
+    InDesign(const NarrowFIRDesign *design)
+        : design_(design), model_(design->model), interpolator_(design->interpolator) {}
+
+    NarrowFIRFilter filter() const {
+        return {design_->kind,        design_->M,    model_.size(),
+                interpolator_.size(), model_.data(), interpolator_.data()};
+    }
+    auto inputs() { return std::tie(model_, interpolator_); }
+
+private:
+    const NarrowFIRDesign *design_;
+    In<DBL1D> model_, interpolator_;
+};
 
 ErrorCode FilterSignal(const NarrowFIRFilter &filter, const In<DBL1D> &x,
                        Out<DBL1D, OnFailure::Keep> &y) {
@@ -114,11 +132,8 @@ ErrorCode FilterSignal(const NarrowFIRFilter &filter, const In<CDB1D> &x,
 }
 
 template <class Signal>
-Outcome RunNarrow(const NarrowFIRDesign &design, const In<Signal> &x,
+Outcome RunNarrow(const NarrowFIRFilter &filter, const In<Signal> &x,
                   Out<Signal, OnFailure::Keep> &y) {
-    const In<DBL1D> model(design.model), interpolator(design.interpolator);
-    const NarrowFIRFilter filter{design.kind,         design.M,     model.size(),
-                                 interpolator.size(), model.data(), interpolator.data()};
     if (!filter.isComplete())
         return ErrEmptyInput;
     const int64_t count = filter.outputCount(x.size());
@@ -131,10 +146,10 @@ Outcome RunNarrow(const NarrowFIRDesign &design, const In<Signal> &x,
 
 // kept: an empty x leaves y as it is.
 template <class Signal>
-Outcome FilterNarrow(In<Signal> x, const NarrowFIRDesign *design, Out<Signal, OnFailure::Keep> y) {
+Outcome FilterNarrow(In<Signal> x, InDesign design, Out<Signal, OnFailure::Keep> y) {
     if (x.isEmpty())
         return ErrEmptyInput;
-    const Outcome outcome = RunNarrow(*design, x, y);
+    const Outcome outcome = RunNarrow(design.filter(), x, y);
     if (outcome.failed())
         y.empty();
     return outcome;

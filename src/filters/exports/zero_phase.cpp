@@ -51,7 +51,7 @@ Outcome FilterDirect(Kept x, In<DBL1D> a, In<DBL1D> b, Kept xForward, Kept xBack
     return outcome;
 }
 
-// kept: here the states stay as they are as well.
+// kept: here the states stay as they are as well, but for one that has another size by then.
 Outcome FilterCascade(Kept x, int32_t form, In<DBL1D> a, In<DBL1D> b, Kept forward, Kept backward,
                       int32_t keepState) {
     if (x.isEmpty())
@@ -61,8 +61,10 @@ Outcome FilterCascade(Kept x, int32_t form, In<DBL1D> a, In<DBL1D> b, Kept forwa
     bool clears = keepState == 0;
     if (const Outcome bad = Fit(forward, a.size(), clears))
         return bad;
-    if (const Outcome bad = Fit(backward, a.size(), clears))
+    if (const Outcome bad = Fit(backward, a.size(), clears)) {
+        Clear(forward);
         return bad;
+    }
     if (clears) {
         Clear(forward);
         Clear(backward);

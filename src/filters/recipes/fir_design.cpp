@@ -82,8 +82,6 @@ std::vector<Recipe> FIRDesignRecipes() {
             const auto design = [=](Call &c) {
                 auto *record = c.recordWithHandles<NarrowFIRDesign>(0);
                 *record = {kind, M, c.in<DBL>(1, 21), c.in<DBL>(2, 15)};
-                c.insideRecord(1);
-                c.insideRecord(2);
                 if (M == 1)
                     c.mayBeEmpty(2);
                 return record;

@@ -431,6 +431,9 @@ TEST(Filtering, ARefusedStateIsEmptiedAndTheSignalIsNot) {
         EXPECT_EQ(err, ErrOutOfMemory);
         EXPECT_EQ(x.size(), 3);
         EXPECT_EQ(refused == 1 ? xState.size() : yState.size(), 0);
+        if (refused == 2) {
+            EXPECT_EQ(xState.values(), (Signal{0, 0})) << "of its new size, and cleared";
+        }
     }
     const DBLArray a{1, 1}, b{1, 1, 1}, state;
     double sample = 1.0;

@@ -166,6 +166,12 @@ TEST(ZeroPhase, FailuresLeaveTheSignal) {
     EXPECT_EQ(cascade(1, x, a, b), ErrCoefficientSizes);
     EXPECT_EQ(cascade(0, x, a, a), ErrCoefficientSizes);
     EXPECT_EQ(forward.size() + backward.size(), 4);
+    ResetHost(2, 77);
+    const DBLArray sections{1, 1, 1, 1}, numerators{1, 1, 1, 1, 1, 1};
+    EXPECT_EQ(cascade(0, x, sections, numerators), 77);
+    ResetHost();
+    EXPECT_EQ(forward.values(), (Signal{0, 0, 0, 0})) << "of its new size, and cleared";
+    EXPECT_EQ(backward.values(), (Signal{3, 4}));
     EXPECT_EQ(x.values(), (Signal{1, 2, 3}));
 }
 

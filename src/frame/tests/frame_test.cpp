@@ -185,6 +185,58 @@ TEST(Frame, AnInputThatIsAnOutputIsReadFromACopy) {
     EXPECT_EQ(z[0], 20);
 }
 
+// A record of the caller's with an array to read and one to write; it may lack either.
+struct Pair {
+    DBL1D read;
+    DBL1D written;
+};
+class InOutPair {
+public:
+    InOutPair(Pair *pair) : read(pair->read), written(pair->written) {}
+    void settleFailure() {
+        if (written.identity() != nullptr)
+            written.empty();
+    }
+    auto inputs() { return std::tie(read); }
+    auto outputs() const { return std::tuple(written.identity()); }
+    In<DBL1D> read;
+    Out<DBL1D> written;
+};
+
+TEST(Frame, TwoOutputsThatAreOneAreRefusedAndRecordsSeenThrough) {
+    int bodies = 0;
+    const auto body = [&bodies](InOutPair pair, InOut<DBL1D> x, qx::OutDBL,
+                                Out<DBL1D> y) -> Outcome {
+        ++bodies;
+        if (const Outcome bad = y.resize(2))
+            return bad;
+        if (pair.read.identity() != nullptr)
+            y.data()[0] = pair.read.data()[0];
+        y.data()[1] = x.data()[0];
+        return 0;
+    };
+    const DBLArray a{1.0}, b{2.0}, c{3.0};
+    double scalar = 5;
+    Pair pair = {a.handle(), b.handle()};
+    const DBLArray y;
+    EXPECT_EQ(returned(body, &pair, c.handle(), &scalar, y.handle()), 0);
+    EXPECT_EQ(y.values(), (std::vector<double>{1, 3}));
+    EXPECT_EQ(returned(body, &pair, c.handle(), &scalar, a.handle()), 0);
+    EXPECT_EQ(a.values(), (std::vector<double>{1, 3})) << "read from a copy";
+    pair = {nullptr, nullptr};
+    EXPECT_EQ(returned(body, &pair, c.handle(), &scalar, y.handle()), 0) << "no arrays, none met";
+    EXPECT_EQ(bodies, 3);
+
+    pair = {a.handle(), b.handle()};
+    EXPECT_EQ(returned(body, &pair, c.handle(), &scalar, c.handle()), ErrInternal);
+    EXPECT_EQ(b.size() + c.size(), 0);
+    EXPECT_EQ(std::bit_cast<uint64_t>(scalar), quietNaN);
+    EXPECT_EQ(a.size(), 2);
+    EXPECT_EQ(returned(body, &pair, y.handle(), &scalar, b.handle()), ErrInternal);
+    EXPECT_EQ(y.size(), 0);
+    EXPECT_EQ(bodies, 3) << "the body has not run";
+}
+
 TEST(Frame, AnInputThatIsSpoiledIsSpoiledInItsCopyWhereItIsTheOutput) {
     const auto body = [](qx::Spoiled<DBL2D> in, Out<DBL2D> out) -> Outcome {
         if (const Outcome bad = out.resize(in.rows(), in.cols()))
@@ -204,11 +256,18 @@ TEST(Frame, AnInputThatIsSpoiledIsSpoiledInItsCopyWhereItIsTheOutput) {
     EXPECT_EQ(returned(body, b.handle(), b.handle()), 0);
     EXPECT_EQ(b.values(), (std::vector<double>{2, 3, 4, 5, 6, 7}));
 
-    // An array that claims a negative size has nothing to copy.
-    const auto sizeOf = [](In<DBL1D> in, Out<DBL1D>) -> ErrorCode { return in.isEmpty() ? -1 : 0; };
+    // An array that says a negative size is empty and has nothing to copy.
+    const auto sizeOf = [](In<DBL1D> in, Out<DBL1D>) -> ErrorCode {
+        return in.hasNegativeSize() && in.isEmpty() && in.size() == 0 ? -1 : 0;
+    };
     const DBLArray broken(1);
     (*broken.handle())->dimSize = -1;
     EXPECT_EQ(returned(sizeOf, broken.handle(), broken.handle()), -1);
+    const DBLMatrix negative(1, 1);
+    (*negative.handle())->dimSizes[0] = (*negative.handle())->dimSizes[1] = -2;
+    const In<DBL2D> matrix(negative.handle());
+    EXPECT_TRUE(matrix.hasNegativeSize() && matrix.isEmpty());
+    EXPECT_EQ(matrix.rows() + matrix.cols(), 0);
 }
 
 TEST(Frame, ChecksDecideByTheFirstOrTheLastFailure) {

@@ -10,6 +10,8 @@ template <class Matrix>
 Outcome Product(In<Matrix> a, In<Matrix> b, Out<Matrix> c, int32_t alignedCopy) {
     if (a.cols() != b.rows())
         return ErrInnerDimensionMismatch;
+    if (a.hasNegativeSize() || b.hasNegativeSize())
+        return ErrNegativeDimension;
     if (const Outcome bad = c.resize(a.rows(), b.cols()))
         return bad;
     return MatrixProduct(a.data(), b.data(), a.rows(), a.cols(), b.cols(), c.data(), alignedCopy);
@@ -18,7 +20,7 @@ Outcome Product(In<Matrix> a, In<Matrix> b, Out<Matrix> c, int32_t alignedCopy) 
 // The copy that a caller asks for would change nothing here.
 template <class Matrix, class Vector>
 Outcome MatrixTimesVector(In<Matrix> a, In<Vector> x, Out<Vector> y) {
-    if (a.rows() < 0 || a.cols() < 0 || x.size() < 0)
+    if (a.hasNegativeSize() || x.hasNegativeSize())
         return ErrNegativeDimension;
     if (a.isEmpty() || x.isEmpty())
         return y.resize(0);
@@ -33,6 +35,8 @@ template <class Matrix, class Vector>
 Outcome VectorTimesMatrix(In<Vector> x, In<Matrix> a, Out<Vector> y, int32_t alignedCopy) {
     if (x.size() != a.rows())
         return ErrInnerDimensionMismatch;
+    if (x.hasNegativeSize() || a.hasNegativeSize())
+        return ErrNegativeDimension;
     if (const Outcome bad = y.resize(a.cols()))
         return bad;
     return MatrixProduct(x.data(), a.data(), 1, x.size(), a.cols(), y.data(), alignedCopy);

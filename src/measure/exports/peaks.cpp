@@ -24,15 +24,15 @@ Outcome Runs(In<DBL1D> x, const double *threshold, const int32_t *width, Out<I32
     return 0;
 }
 
-// The caller's request: its last arrays are outputs of the call.
+// The caller's request: its last arrays are outputs of the call, and its first one may be changed.
 class InOutRequest {
 public:
     InOutRequest(PeakDRequest *request)
-        : request_(request), locations_(request->locations), amplitudes_(request->amplitudes),
+        : request_(request), data_(request->data), locations_(request->locations), amplitudes_(request->amplitudes),
           derivatives_(request->derivatives) {}
 
     const PeakDRequest *operator->() const { return request_; }
-    InOut<DBL1D> data() const { return InOut<DBL1D>(request_->data); }
+    const Spoiled<DBL1D> &data() const { return data_; }
 
     Outcome take(const PeakList &found) {
         for (InOut<DBL1D> *array : {&locations_, &amplitudes_, &derivatives_})
@@ -55,9 +55,14 @@ public:
         derivatives_.empty();
         request_->count = 0;
     }
+    auto inputs() { return std::tie(data_); }
+    auto outputs() const {
+        return std::tuple(locations_.identity(), amplitudes_.identity(), derivatives_.identity());
+    }
 
 private:
     PeakDRequest *request_;
+    Spoiled<DBL1D> data_;
     InOut<DBL1D> locations_, amplitudes_, derivatives_;
 };
 
@@ -104,6 +109,9 @@ public:
         if (words_.buffer != nullptr && *words_.buffer != nullptr)
             InOut<DBL1D>(*words_.buffer).empty();
     }
+    auto outputs() const {
+        return std::tuple<const void *>(words_.buffer == nullptr ? nullptr : *words_.buffer);
+    }
 
 private:
     Words words_;
@@ -123,7 +131,7 @@ public:
         return 0;
     }
     // Whose block stays where it is as long as the step runs.
-    void showOf(const InOut<DBL1D> &array) {
+    void showOf(const Spoiled<DBL1D> &array) {
         shown_ = array.data();
         size_ = array.size();
     }

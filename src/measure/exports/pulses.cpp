@@ -246,8 +246,7 @@ int32_t PulseParameters(DBL1D y, double *top, double *base, double *amplitude, d
 }
 
 ErrorCode MeasurementUnreserveProc(MeasurementInstanceWord *instance) {
-    qx::MeasurementInstanceRelease(instance);
-    return 0;
+    return qx::MeasurementInstanceRelease(instance);
 }
 
 void measurements_create() {}

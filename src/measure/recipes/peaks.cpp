@@ -35,7 +35,10 @@ Recipe OverStream(const char *name, const Function &function, const Stream &stre
                 request->locations = c.out<DBL>(0);
                 request->amplitudes = c.out<DBL>(1);
                 request->derivatives = c.out<DBL>(2);
-                c.insideRecord(0);
+                if (stream.calls == 2) {
+                    c.isReadAgain(0);
+                    c.isReadAgain(1);
+                }
                 if (stream.mode == 2)
                     c.mayBeEmpty(0);
                 auto *state = c.recordWithHandles<PeakDState>(1);
@@ -43,7 +46,6 @@ Recipe OverStream(const char *name, const Function &function, const Stream &stre
                 DBL1D source = c.in<DBL>(1, c.n + 6);
                 if (stream.mode != 2)
                     c.mayBeEmpty(1);
-                c.insideRecord(1);
 
                 request->flags = QXPeakFirstBlock;
                 ErrorCode status = function(source, request, state, &buffer, c.err(), stream.mode);

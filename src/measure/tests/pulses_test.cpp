@@ -279,6 +279,12 @@ TEST(Slots, BelongToTheHostOrToTheNode) {
         void *const first = node.word;
         EXPECT_EQ(node.levels(y, 0, 5000).status, 0);
         EXPECT_EQ(node.word, first) << "resized in place";
+        Node slot;
+        EXPECT_EQ(slot.levels(y, 0, 10).status, 0);
+        void *wrong = slot.word;
+        EXPECT_EQ(MeasurementUnreserveProc(&wrong), ErrInternal) << "that is swept by the host";
+        EXPECT_EQ(wrong, slot.word);
+        qx::test::RunSweepOf(std::exchange(slot.word, nullptr));
         EXPECT_EQ(qx::test::RegisteredSweeps(), 0);
         EXPECT_EQ(MeasurementUnreserveProc(&node.word), 0);
         EXPECT_EQ(node.word, nullptr);

@@ -33,7 +33,7 @@ Outcome DecimateContinuous(InOut<Array> x, int32_t factor, bool average, int32_t
         *partialCount = 0;
         *partialSum = {};
     }
-    const int32_t n = std::max(0, x.size());
+    const int32_t n = x.size();
     return x.resize(average
                         ? AverageStream<code>(x.data(), n, factor, start, partialCount, partialSum)
                         : PickFromStream<code>(x.data(), n, factor, start));
@@ -63,7 +63,7 @@ ErrorCode CheckFIR(In<DBL1D> h, int32_t factor) {
 }
 
 FIRBlock<ElementType::DBL> BlockOf(In<DBL1D> x, In<DBL1D> h) {
-    return {x.data(), std::max(0, x.size()), h.data(), h.size()};
+    return {x.data(), x.size(), h.data(), h.size()};
 }
 
 Outcome InterpolatedFIR(In<DBL1D> x, Out<DBL1D> y, int32_t L, double gain, In<DBL1D> h,
@@ -86,7 +86,7 @@ Outcome Interpolator(In<DBL1D> x, Out<DBL1D> y, double gain, int32_t L, In<DBL1D
         return bad;
     if (const Outcome bad = PrepareState(state, (h.size() - 1) / L + 1, reset))
         return bad;
-    const int64_t positions = int64_t{std::max(0, x.size())} * L;
+    const int64_t positions = int64_t{x.size()} * L;
     const OutputRange outputs(positions, 0, 1, std::max(0, *delay));
     if (const ErrorCode bad = ResizeOutput(y, outputs.count))
         return bad;
@@ -106,7 +106,7 @@ Outcome Decimator(In<DBL1D> x, Out<DBL1D> y, double, int32_t M, In<DBL1D> h, InO
     if (reset)
         state.data()[underWay] = Modulo(-int64_t{firstPhase}, M);
 
-    const int32_t n = std::max(0, x.size());
+    const int32_t n = x.size();
     const int32_t phase = Modulo(Truncated(state.data()[underWay]), M);
     const int32_t first = Modulo(-int64_t{phase}, M);
     const OutputRange outputs(n, first, M, std::max(0, *delay));
@@ -138,7 +138,7 @@ Outcome CICDecimator(In<DBL1D> x, Out<DBL1D> y, InOut<DBL1D> state, int32_t stag
     if (const Outcome bad = PrepareState(state, phaseAt + 1, reset))
         return bad;
 
-    const int32_t n = std::max(0, x.size());
+    const int32_t n = x.size();
     const int32_t phase = std::max(0, Truncated(state.data()[phaseAt]));
     const int64_t first = *delay > 0 ? *delay : phase;
     const OutputRange outputs(n, static_cast<int32_t>(first), factor, 0);
@@ -163,7 +163,7 @@ Outcome CICInterpolator(In<DBL1D> x, Out<DBL1D> y, InOut<DBL1D> state, int32_t s
     if (const Outcome bad = PrepareState(state, shape.stateSize(), reset))
         return bad;
 
-    const int32_t n = std::max(0, x.size());
+    const int32_t n = x.size();
     const OutputRange outputs(int64_t{n} * factor, 0, 1, std::max(0, *delay));
     if (const ErrorCode bad = ResizeOutput(y, outputs.count))
         return bad;
@@ -181,7 +181,7 @@ ErrorCode DecimatedMovingAverage(InOut<Array> x, int32_t factor,
         *sum = {};
         *count = 0;
     }
-    const int32_t n = std::max(0, x.size());
+    const int32_t n = x.size();
     outCount =
         factor < 2 ? n : SumGroups<HandleTraits<Array>::code>(x.data(), n, factor, sum, count);
     return 0;
@@ -211,7 +211,7 @@ ErrorCode CascadedMovingAverage(InOut<Array> x, int32_t stages, int32_t width, I
         return 0;
     MovingSumState<code> state{buffers.data(), width, sums.data(),      1,
                                stages,         width, *position % width};
-    MovingSumStages<code>(state, MovingSum::Plain, 1.0, x.data(), std::max(0, x.size()));
+    MovingSumStages<code>(state, MovingSum::Plain, 1.0, x.data(), x.size());
     *position = state.position;
     return 0;
 }

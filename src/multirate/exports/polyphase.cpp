@@ -63,7 +63,7 @@ struct Multirate {
                        const uint8_t *removeDelay, OutI32 delayLeft, OutI32 phase) {
         const MultirateRequest request{mode, L, M, *reset != 0 || state.isEmpty(),
                                        *removeDelay != 0};
-        const int32_t n = std::max(0, x.size());
+        const int32_t n = x.size();
         if (const ErrorCode bad =
                 CheckMultirateArgs(request, h.size(), delayLeft.address(), phase.address()))
             return bad;

@@ -39,8 +39,8 @@ struct Rational {
         if (const ErrorCode bad = FirstFailed({{*offset < 0 || *stateCount < 0, ErrNegativeSetting},
                                                {L < 1 || M < 1, ErrNotStrictlyPositive}}))
             return bad;
-        const int32_t channels = std::max(0, Channels(x));
-        const int32_t n = std::max(0, SamplesPerChannel(x));
+        const int32_t channels = Channels(x);
+        const int32_t n = SamplesPerChannel(x);
         if (const Outcome bad = prepareState(state, channels, h.size(), L, reset != 0, stateCount))
             return bad;
 

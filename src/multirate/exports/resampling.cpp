@@ -10,6 +10,26 @@
 namespace qx {
 namespace {
 
+// The caller's design, whose table is an input of the call.
+template <class Design>
+class InDesign {
+public:
+    InDesign(const Design *design) : design_(design), proto_(design->proto) {}
+
+    const Design *operator->() const { return design_; }
+    ResampleFilter filter(int32_t mode) const {
+        return {proto_.data(), proto_.size(), design_->oversample, mode == 1};
+    }
+    int32_t protoSize() const { return proto_.size(); }
+    auto inputs() { return std::tie(proto_); }
+
+private:
+    const Design *design_;
+    In<DBL1D> proto_;
+};
+typedef InDesign<ResampleDesign> ConstantDesign;
+typedef InDesign<VariableDesign> DesignForTimes;
+
 // The caller's record: its arrays are outputs of the call, and a failure clears its numbers.
 template <class State>
 class InOutState {
@@ -29,6 +49,7 @@ public:
         const State empty{state_->history, 0, state_->taps, 0, 0, 0, 0, 0, 0, 0};
         *state_ = empty;
     }
+    auto outputs() const { return std::tuple(history_.identity(), taps_.identity()); }
 
 private:
     State *state_;
@@ -37,9 +58,10 @@ private:
 };
 
 template <class State>
-Outcome BeginStream(InOutState<State> &state, const ResampleDesign &design, int32_t len) {
+Outcome BeginStream(InOutState<State> &state, const ConstantDesign &design) {
     constexpr ElementType code = InOutState<State>::code;
-    const TapSpan span = ComputeTapSpan(len, design.oversample, design.ratio, 0);
+    const TapSpan span =
+        ComputeTapSpan(design.protoSize(), design->oversample, design->ratio, 0);
     const int64_t size = std::max<int64_t>(span.taps() + 1, 0);
     if (size > std::numeric_limits<int32_t>::max())
         return ErrBufferOverrun;
@@ -51,20 +73,19 @@ Outcome BeginStream(InOutState<State> &state, const ResampleDesign &design, int3
     ClearSamples<ElementType::DBL>(state.taps().data(), size);
     state->historyCount = 0;
     state->tapScale = span.step;
-    state->mode = design.mode;
-    state->ratio = design.ratio;
-    state->position = Truncated(design.start);
-    state->fraction = design.start - std::trunc(design.start);
+    state->mode = design->mode;
+    state->ratio = design->ratio;
+    state->position = Truncated(design->start);
+    state->fraction = design->start - std::trunc(design->start);
     return 0;
 }
 
 template <class Array, class State>
-Outcome Constant(In<Array> x, InOutState<State> state, const ResampleDesign *design, int32_t reset,
+Outcome Constant(In<Array> x, InOutState<State> state, ConstantDesign design, int32_t reset,
                  Out<Array> y, OutI32 outCount, int32_t antiAlias) {
     constexpr ElementType code = HandleTraits<Array>::code;
-    const In<DBL1D> proto(design->proto);
     if (reset != 0)
-        if (const Outcome bad = BeginStream(state, *design, proto.size()))
+        if (const Outcome bad = BeginStream(state, design))
             return bad;
 
     ResampleCore<code> core{state.history().data(), state.history().size(), state->historyCount,
@@ -73,16 +94,16 @@ Outcome Constant(In<Array> x, InOutState<State> state, const ResampleDesign *des
                             state->fraction};
     if (core.historyCount < 0 || core.historyCount > core.historyCapacity)
         return ErrBufferOverrun;
-    const int32_t n = std::max(0, x.size());
+    const int32_t n = x.size();
     const double room = std::ceil((double{1} * n + core.historyCount) / state->ratio);
     if (!(room <= std::numeric_limits<int32_t>::max()))
         return ErrOutOfMemory;
     if (const Outcome bad = y.resize(room > 0 ? static_cast<int32_t>(room) : 0))
         return bad;
 
-    const ResampleFilter filter{proto.data(), proto.size(), design->oversample, state->mode == 1};
-    if (const ErrorCode bad = ResampleConstant(filter, core, state->ratio, antiAlias != 0, x.data(),
-                                               n, y.data(), y.size(), outCount.address()))
+    if (const ErrorCode bad =
+            ResampleConstant(design.filter(state->mode), core, state->ratio, antiAlias != 0,
+                             x.data(), n, y.data(), y.size(), outCount.address()))
         return bad;
     ClearSamples<code>(y.data() + *outCount.address(), y.size() - *outCount.address());
     state->historyCount = core.historyCount;
@@ -94,33 +115,28 @@ Outcome Constant(In<Array> x, InOutState<State> state, const ResampleDesign *des
     return 0;
 }
 
-ResampleFilter FilterOf(const VariableDesign &design) {
-    const In<DBL1D> proto(design.proto);
-    return {proto.data(), proto.size(), design.oversample, design.mode == 1};
-}
-
 // The outputs take the places of the times that they stand at.
 template <class Array>
-ErrorCode Variable(In<Array> x, InOut<Array> t, const VariableDesign *design, double *lastTime,
+ErrorCode Variable(In<Array> x, InOut<Array> t, DesignForTimes design, double *lastTime,
                    OutI32 outCount, OutI32 consumed) {
     constexpr ElementType code = HandleTraits<Array>::code;
-    return ResampleAtTimes<code, code>(FilterOf(*design), design->antiAlias != 0, x.data(),
-                                       std::max(0, x.size()), 1, t.data(), t.size(), lastTime,
+    return ResampleAtTimes<code, code>(design.filter(design->mode), design->antiAlias != 0, x.data(),
+                                       x.size(), 1, t.data(), t.size(), lastTime,
                                        outCount.address(), consumed.address(), t.data(), 0);
 }
 
 template <class Matrix>
 Outcome VariableOfChannels(In<Matrix> x, Out<Matrix> y, InOut<DBL1D> t,
-                           const VariableDesign *design, double *lastTime, OutI32 outCount,
+                           DesignForTimes design, double *lastTime, OutI32 outCount,
                            OutI32 consumed) {
     constexpr ElementType code = HandleTraits<Matrix>::code;
-    const int32_t channels = std::max(0, x.rows());
-    const int32_t m = std::max(0, t.size());
+    const int32_t channels = x.rows();
+    const int32_t m = t.size();
     Scratch<code> results;
     if (const ErrorCode failed = results.allocate(int64_t{channels} * m))
         return failed;
     if (const ErrorCode failed = ResampleAtTimes<code, ElementType::DBL>(
-            FilterOf(*design), design->antiAlias != 0, x.data(), std::max(0, x.cols()), channels,
+            design.filter(design->mode), design->antiAlias != 0, x.data(), x.cols(), channels,
             t.data(), m, lastTime, outCount.address(), consumed.address(), results.data(), m))
         return failed;
     const int32_t served = *outCount.address();

@@ -32,7 +32,6 @@ Recipe AtConstantSpacing(const char *name, Function *function, int32_t mode, int
                 }
                 auto *design = c.recordWithHandles<ResampleDesign>(0);
                 *design = {1.3, mode, 0.4, c.in<DBL>(1, 161, Bell), 10};
-                c.insideRecord(1);
                 auto *state = c.recordWithHandles<State>(1);
                 *state = {c.inOut<Code>(2, 30), 5, c.inOut<DBL>(3, 40), 0, 0, 0, mode, 1.3, 0.4, 3};
                 const auto status = function(c.in<Code>(0), state, design, reset, c.out<Code>(0),

@@ -74,9 +74,12 @@ Outcome AutoCorrelate(InOut<DBL1D, OnFailure::Keep> x, const DBL1D &handle, int3
         return failed;
     std::memcpy(copy.data(), x.data(), sizeof(DBL) * static_cast<std::size_t>(n));
     const int32_t count = 2 * n - 1;
-    if (!x.resize(count).failed())
+    if (!x.resize(count).failed()) {
+        // Where the work lacks memory this is what follows the n values.
+        Fill(x.data() + n, n - 1, 0.0);
         return CorrelateReal(copy.data(), n, copy.data(), n, ConvolveByTransform, x.data(),
                              normalization);
+    }
     // The block still holds n values and no more.
     (*handle)->dimSize = count;
     if (const ErrorCode failed = unheld.allocate(count))

@@ -283,6 +283,19 @@ TEST(AutoCorrelation, GoesOnAfterARefusedResizeInsideItsBlock) {
     AutoCorrelation80(unnormalized.handle(), 3, &err);
     EXPECT_EQ(err, ErrInvalidSelector);
     EXPECT_EQ(unnormalized.size(), 79) << "the result stands";
+
+    // Without memory for the work the values stay, with zeros behind them.
+    if (!qx::test::HeapProbe::works())
+        return;
+    const DBLArray unfinished(values);
+    {
+        const qx::test::HeapProbe secondFails(2);
+        AutoCorrelation80(unfinished.handle(), 0, &err);
+    }
+    EXPECT_EQ(err, ErrOutOfMemory);
+    Signal expected = values;
+    expected.resize(79);
+    EXPECT_EQ(unfinished.values(), expected);
 }
 
 struct Division {

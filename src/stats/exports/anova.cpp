@@ -7,6 +7,8 @@ namespace qx {
 namespace {
 
 ErrorCode Contingency(In<I32_2D> table, OutDBL chiSquare, OutDBL p) {
+    if (table.hasNegativeSize())
+        return ErrTableNegativeSize;
     return ContingencyTest(table.data(), table.rows(), table.cols(), chiSquare.address(),
                            p.address());
 }

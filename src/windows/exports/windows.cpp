@@ -93,8 +93,10 @@ ErrorCode Symmetric(InOut<Handle> x, int32_t selector, double param) {
 // kept: a negative size leaves the constants alone; any other failure settles them.
 template <class Handle>
 ErrorCode Scaled(InOut<Handle> x, int32_t selector, double param, WindowConstants *constants) {
+    if (x.hasNegativeSize())
+        return ErrNegativeDimension;
     const ErrorCode status = ApplyScaledWindow(Samples(x), x.size(), selector, param, constants);
-    if (status < 0 && status != ErrNegativeDimension)
+    if (status < 0)
         OutValue<WindowConstants>(constants).settleFailure();
     return status;
 }
@@ -102,6 +104,9 @@ ErrorCode Scaled(InOut<Handle> x, int32_t selector, double param, WindowConstant
 template <class Handle>
 ErrorCode BySelector(InOut<Handle> x, int32_t selector, double param, int32_t scaled,
                      int32_t symmetric) {
+    // The scaled form alone tells a negative size from an empty array.
+    if (scaled != 0 && symmetric == 0 && x.hasNegativeSize())
+        return ErrNegativeDimension;
     return ApplyWindowBySelector(Samples(x), x.size(), selector, param, scaled, symmetric);
 }
 
