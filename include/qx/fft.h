@@ -12,8 +12,8 @@
 
    An export keeps its plan from call to call in a slot: a word of the caller's, null at first, of
    which the host is told so that it can clean up. An _IDP export keeps it in the host's instance
-   data, which TransformUnreserveProc gives back, and is otherwise its twin. A word that holds what a
-   slot of another kind, an _IDP export or a measurement keeps is refused; any other address in it
+   data, which TransformUnreserveProc gives back, and is otherwise its twin. A word that holds what
+   a slot of another kind, an _IDP export or a measurement keeps is refused; any other address in it
    cannot be told from a plan and must not stand there. */
 
 #include "qx/types.h"

@@ -28,8 +28,7 @@ ErrorCode Acquire(PlanSlot *slot, int32_t n) {
     qx::destroy_oxfft_table(cell->plan);
     cell->plan = qx::create_oxfft_table(n);
     // A plan that nobody would sweep is none.
-    if (cell->plan && isSwept && isNew &&
-        HostRegisterSweep(CellSweep, cell, SweepForObject) != 0) {
+    if (cell->plan && isSwept && isNew && HostRegisterSweep(CellSweep, cell, SweepForObject) != 0) {
         qx::destroy_oxfft_table(cell->plan);
         cell->plan = nullptr;
     }

@@ -23,8 +23,8 @@ struct TransformInstance {
 };
 
 // Makes the slot hold a plan of length n. A plan of that length that is there already is left
-// as it is, without a look into the plan cache. 0; ErrInternal for a slot that holds something else,
-// which stays; ErrOutOfMemory, with the slot then null.
+// as it is, without a look into the plan cache. 0; ErrInternal for a slot that holds something
+// else, which stays; ErrOutOfMemory, with the slot then null.
 //
 // The first form registers a sweep for the cell with the host; the IDP form registers nothing,
 // because the host gives instance data back through TransformUnreserveProc.

@@ -39,11 +39,17 @@ namespace qx {
 namespace detail {
 
 template <class Parameter>
-concept SettlesFailure = requires(Parameter parameter) { parameter.settleFailure(); };
+concept SettlesFailure = requires(Parameter parameter) {
+    parameter.settleFailure();
+};
 template <class Parameter>
-concept HasInputs = requires(Parameter parameter) { parameter.inputs(); };
+concept HasInputs = requires(Parameter parameter) {
+    parameter.inputs();
+};
 template <class Parameter>
-concept HasOutputs = requires(Parameter parameter) { parameter.outputs(); };
+concept HasOutputs = requires(Parameter parameter) {
+    parameter.outputs();
+};
 
 // Where an input that is also an output has its copy.
 struct Copy {
@@ -105,9 +111,9 @@ private:
     }
 
     Identities identitiesOfOutputs() const {
-        const auto all = std::apply(
-            [](auto &...parameter) { return std::tuple_cat(OutputsOf(parameter)...); },
-            parameters_);
+        const auto all =
+            std::apply([](auto &...parameter) { return std::tuple_cat(OutputsOf(parameter)...); },
+                       parameters_);
         return std::apply([](auto... identity) { return Identities{identity...}; }, all);
     }
     // A record may carry no array where none is needed.
@@ -133,9 +139,9 @@ private:
                 status = input.readCopyIn(copy.memory, copy.block);
             return status == 0;
         };
-        std::apply([&](auto &...input) { (void)(copyIfMet(input) && ...); },
-                   std::apply(
-                       [](auto &...parameter) { return std::tuple_cat(InputsOf(parameter)...); },
+        std::apply(
+            [&](auto &...input) { (void)(copyIfMet(input) && ...); },
+            std::apply([](auto &...parameter) { return std::tuple_cat(InputsOf(parameter)...); },
                        parameters_));
         return status;
     }

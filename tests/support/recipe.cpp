@@ -98,8 +98,8 @@ Call::Array &Call::add(Role role, const Place &place, std::unique_ptr<Array> arr
         if (place.number == claimed_.input)
             for (std::size_t i = 0; i < array->sizes().size(); ++i)
                 if (claimed_.dimension == all || claimed_.dimension == static_cast<int>(i))
-                    std::memcpy(const_cast<unsigned char *>(array->block()) + 4 * i,
-                                &claimed_.size, sizeof claimed_.size);
+                    std::memcpy(const_cast<unsigned char *>(array->block()) + 4 * i, &claimed_.size,
+                                sizeof claimed_.size);
         array->remember();
         if (find(place) != nullptr)
             throw std::logic_error("a recipe with two inputs of number " +

@@ -229,10 +229,10 @@ public:
         Place first, second;
     };
     enum class Meeting {
-        ReadTwice,     // two inputs
+        ReadTwice,      // two inputs
         ReadAndWritten, // an input and an output
-        WrittenTwice,  // two outputs
-        Unknown        // one of them is written by the way
+        WrittenTwice,   // two outputs
+        Unknown         // one of them is written by the way
     };
     std::vector<std::pair<Pair, Meeting>> pairsOfOneType() const;
     void share(const Pair &pair) { shared_ = pair, sharing_ = Sharing::OneArray; }
@@ -269,7 +269,7 @@ private:
 
         Role role = Role::Output;
         bool isRecords = false;
-        bool isCounted = true; // in the result
+        bool isCounted = true;             // in the result
         std::vector<unsigned char> before; // content at the start, for inputs
     };
     template <ElementType Code>

@@ -28,8 +28,8 @@ Outcome Runs(In<DBL1D> x, const double *threshold, const int32_t *width, Out<I32
 class InOutRequest {
 public:
     InOutRequest(PeakDRequest *request)
-        : request_(request), data_(request->data), locations_(request->locations), amplitudes_(request->amplitudes),
-          derivatives_(request->derivatives) {}
+        : request_(request), data_(request->data), locations_(request->locations),
+          amplitudes_(request->amplitudes), derivatives_(request->derivatives) {}
 
     const PeakDRequest *operator->() const { return request_; }
     const Spoiled<DBL1D> &data() const { return data_; }

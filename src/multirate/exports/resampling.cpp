@@ -60,8 +60,7 @@ private:
 template <class State>
 Outcome BeginStream(InOutState<State> &state, const ConstantDesign &design) {
     constexpr ElementType code = InOutState<State>::code;
-    const TapSpan span =
-        ComputeTapSpan(design.protoSize(), design->oversample, design->ratio, 0);
+    const TapSpan span = ComputeTapSpan(design.protoSize(), design->oversample, design->ratio, 0);
     const int64_t size = std::max<int64_t>(span.taps() + 1, 0);
     if (size > std::numeric_limits<int32_t>::max())
         return ErrBufferOverrun;
@@ -120,15 +119,14 @@ template <class Array>
 ErrorCode Variable(In<Array> x, InOut<Array> t, DesignForTimes design, double *lastTime,
                    OutI32 outCount, OutI32 consumed) {
     constexpr ElementType code = HandleTraits<Array>::code;
-    return ResampleAtTimes<code, code>(design.filter(design->mode), design->antiAlias != 0, x.data(),
-                                       x.size(), 1, t.data(), t.size(), lastTime,
+    return ResampleAtTimes<code, code>(design.filter(design->mode), design->antiAlias != 0,
+                                       x.data(), x.size(), 1, t.data(), t.size(), lastTime,
                                        outCount.address(), consumed.address(), t.data(), 0);
 }
 
 template <class Matrix>
-Outcome VariableOfChannels(In<Matrix> x, Out<Matrix> y, InOut<DBL1D> t,
-                           DesignForTimes design, double *lastTime, OutI32 outCount,
-                           OutI32 consumed) {
+Outcome VariableOfChannels(In<Matrix> x, Out<Matrix> y, InOut<DBL1D> t, DesignForTimes design,
+                           double *lastTime, OutI32 outCount, OutI32 consumed) {
     constexpr ElementType code = HandleTraits<Matrix>::code;
     const int32_t channels = x.rows();
     const int32_t m = t.size();
