@@ -2,6 +2,7 @@
 #define QX_FRAME_NODE_CELL_H
 
 #include "qx/errors.h"
+#include "qx/types.h"
 
 #include <cstddef>
 #include <cstdint>
