@@ -152,7 +152,8 @@ QX_API ErrorCode CxSymmWinH(QX_INOUT CDB1D x, int32_t selector, double param);
     those of the window before the division, NaN after a failure; for cosine sums they are stored
     values, so x may be empty there. The parameter is used as it stands; that of selector 61 is a
     linear ratio.
-    Codes: ErrInvalidSelector (another selector), ErrEmptyInput (x is empty), ErrOutOfMemory (no
+    Codes: ErrNegativeDimension (x says a negative size; `constants` stay as they are),
+    ErrInvalidSelector (another selector), ErrEmptyInput (x is empty), ErrOutOfMemory (no
     scratch memory or no plan). */
 QX_API ErrorCode ScaledWinH(QX_INOUT DBL1D x, int32_t selector, double param,
                             QX_OUT WindowConstants *constants);
@@ -163,7 +164,8 @@ QX_API ErrorCode CxScaledWinH(QX_INOUT CDB1D x, int32_t selector, double param,
 /** Any window in any form: divided by its coherent gain if `scaled` is non-zero, symmetric if
     `symmetric` is non-zero. A NaN as parameter, for selectors 61 and 62 also a negative one, means
     the default; that of selector 61 is in decibels.
-    Codes: ErrInvalidSelector (both forms at once or an unknown selector), ErrEmptyInput (x is
+    Codes: ErrInvalidSelector (both forms at once or an unknown selector), ErrNegativeDimension (x
+    says a negative size and `scaled` is non-zero), ErrEmptyInput (x is
     empty), ErrFewerThanTwo (force or exponential with fewer than 2 samples),
     ErrFinalValueNotPositive (exponential with a final value that is not above 0), ErrOutOfMemory
     (no scratch memory or no plan). */
