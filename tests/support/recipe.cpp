@@ -335,7 +335,7 @@ void Call::releaseNodes() {
     for (auto &[number, slot] : slots_)
         if (slot != preset_)
             RunSweepOf(std::exchange(slot, nullptr));
-    if (instance_ != preset_)
+    if (instance_ != nullptr && instance_ != preset_)
         releaseInstance_(&instance_);
 }
 
