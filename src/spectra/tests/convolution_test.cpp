@@ -3,6 +3,7 @@
 #include "qx/errors.h"
 #include "spectra/convolution.h"
 #include "spectra/deconvolution.h"
+#include "tests/support/heap_probe.h"
 #include "tests/support/hostile_host.h"
 #include "tests/support/transform_reference.h"
 
