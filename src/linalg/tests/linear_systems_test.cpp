@@ -415,10 +415,11 @@ TEST(Tridiagonal, FactorsSolveForMatrixAndTranspose) {
                   0);
         EXPECT_LT(BackwardError(full, n, b, x.values()), 4.0);
     }
-    DBLVector one({1}), two({1, 1}), out(0);
+    DBLVector one({1}), two({1, 1}), other({1}), out(0);
     I32Vector none(0);
-    EXPECT_EQ(TriDiagLU_head(one.handle(), two.handle(), one.handle(), out.handle(), none.handle()),
-              ErrFewerThanThree);
+    EXPECT_EQ(
+        TriDiagLU_head(one.handle(), two.handle(), other.handle(), out.handle(), none.handle()),
+        ErrFewerThanThree);
     // A pivot that points elsewhere would make the solver read outside of b.
     pivots.data()[n - 1] = n + 1;
     DBLVector x(n);

@@ -45,7 +45,7 @@ ErrorCode PackIntervals(const In<HistInterval1D> &intervals, ScratchBytes &packe
 Outcome InIntervals(In<DBL1D> x, In<HistInterval1D> intervals, Out<I32_1D> counts,
                     OutValue<HistSummary> summary) {
     const int32_t count = intervals.size();
-    if (count < 0)
+    if (intervals.hasNegativeSize())
         return ErrSizesDisagree;
     if (const Outcome bad = counts.resize(count))
         return bad;
