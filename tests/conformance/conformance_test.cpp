@@ -198,7 +198,8 @@ TEST_P(Conformance, AnInputThatSaysANegativeSizeIsEmpty) {
             const Result result = run(broken);
             CheckBlocks();
             const bool hasOwnCode =
-                result.status == ErrNegativeDimension || result.status == ErrTableNegativeSize;
+                result.status == ErrNegativeDimension || result.status == ErrTableNegativeSize ||
+                (result.status == ErrSizesDisagree && GetParam().exportName() == "GenHistH");
             if (!hasOwnCode) {
                 EXPECT_EQ(result.status, run(empty).status);
             }
