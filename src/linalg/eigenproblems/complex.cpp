@@ -42,7 +42,7 @@ public:
         if (withVectors)
             CopyTransposed<E>(q, stride_, n_, n_, transposed, stride_);
         if (const ErrorCode failed =
-                ComplexSchurIteration(h, stride_, n_, range, values, transposed))
+                ComplexSchurIteration(h, stride_, n_, range, 0.0, values, transposed))
             return failed;
         if (withVectors)
             writeVectors(range, vectors);

@@ -31,8 +31,10 @@ struct ComplexRotation {
 
 class ComplexQR {
 public:
-    ComplexQR(CDB *h, std::ptrdiff_t stride, int32_t n, Balanced range, CDB *transposed)
-        : h_(h), stride_(stride), n_(n), range_(range), transposed_(transposed) {}
+    ComplexQR(CDB *h, std::ptrdiff_t stride, int32_t n, Balanced range, double negligible,
+              CDB *transposed)
+        : h_(h), stride_(stride), n_(n), range_(range), negligible_(negligible),
+          transposed_(transposed) {}
 
     ErrorCode run(CDB *values) {
         for (int32_t i = 0; i < n_; ++i)
@@ -68,7 +70,7 @@ private:
             double size = AbsSum(at(l - 1, l - 1)) + AbsSum(at(l, l));
             if (size == 0.0)
                 size = norm_;
-            if (!(AbsSum(at(l, l - 1)) > epsilon * size))
+            if (!(AbsSum(at(l, l - 1)) > std::max(epsilon * size, negligible_)))
                 break;
         }
         return l;
@@ -123,6 +125,7 @@ private:
     std::ptrdiff_t stride_;
     int32_t n_;
     Balanced range_;
+    double negligible_;
     CDB *transposed_;
     double norm_ = 0.0;
 };
@@ -130,8 +133,8 @@ private:
 } // namespace
 
 ErrorCode ComplexSchurIteration(CDB *h, std::ptrdiff_t stride, int32_t n, Balanced range,
-                                CDB *values, CDB *transposed) {
-    return ComplexQR(h, stride, n, range, transposed).run(values);
+                                double negligible, CDB *values, CDB *transposed) {
+    return ComplexQR(h, stride, n, range, negligible, transposed).run(values);
 }
 
 } // namespace qx

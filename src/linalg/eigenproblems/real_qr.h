@@ -1,0 +1,23 @@
+#ifndef QX_LINALG_EIGENPROBLEMS_REAL_QR_H
+#define QX_LINALG_EIGENPROBLEMS_REAL_QR_H
+
+#include "linalg/factorisations/balance.h"
+#include "qx/errors.h"
+
+namespace qx {
+
+// The sum of the absolute values of a Hessenberg matrix.
+double SumOfHessenberg(const DBL *h, std::ptrdiff_t stride, int32_t n);
+
+// The double-shift QR iteration on a real Hessenberg matrix h, in the block `range`. With
+// `transposed`, which holds the transposed basis in rows `stride` apart as those of h are, h
+// becomes the quasi-triangular Schur form and `transposed` its transposed vectors; with null only
+// the values come out. The form has a block of two where a value has a positive imaginary part, and
+// what it holds elsewhere below its diagonal means nothing. An element beside the diagonal counts
+// as 0 where it is within eps of its neighbours or at most `negligible`. ErrIterationLimit.
+ErrorCode RealSchurIteration(DBL *h, std::ptrdiff_t stride, int32_t n, Balanced range,
+                             double negligible, CDB *values, DBL *transposed);
+
+} // namespace qx
+
+#endif

@@ -1,0 +1,37 @@
+#ifndef QX_LINALG_EQUATIONS_MATRIX_EQUATIONS_H
+#define QX_LINALG_EQUATIONS_MATRIX_EQUATIONS_H
+
+#include "qx/types.h"
+
+namespace qx {
+
+enum SylvesterEquation : int32_t {
+    sylvesterSum = 0,        // a x + x b = c
+    sylvesterDifference = 1, // a x - x b = c
+    sylvesterProducts = 2    // a x b - x = c
+};
+enum LyapunovEquation : int32_t {
+    lyapunovContinuous = 0, // a x + x a^H = q
+    lyapunovDiscrete = 1    // a x a^H - x + q = 0
+};
+
+// a is m by m, b n by n, c and x m by n; n and m are positive. x shares no element with the others.
+// Through the Schur forms of a and b and back substitution by blocks (R. H. Bartels and G. W.
+// Stewart, 1972; for the products J. D. Gardiner, A. J. Laub, J. J. Amato and C. B. Moler,
+// "Solution of the Sylvester matrix equation AXB^T + CXD^T = E", 1992). Scaled by powers of two so
+// that nothing overflows but the result.
+//
+// ErrInvalidSelector, ErrNonFiniteInput, ErrIterationLimit, ErrSingularMatrix, ErrOverflow,
+// ErrOutOfMemory.
+ErrorCode SolveSylvester(const DBL *a, int32_t m, const DBL *b, int32_t n, const DBL *c,
+                         int32_t equation, DBL *x);
+ErrorCode SolveSylvester(const CDB *a, int32_t m, const CDB *b, int32_t n, const CDB *c,
+                         int32_t equation, CDB *x);
+
+// All n by n; x is Hermitian to the bit where q is.
+ErrorCode SolveLyapunov(const DBL *a, int32_t n, const DBL *q, int32_t equation, DBL *x);
+ErrorCode SolveLyapunov(const CDB *a, int32_t n, const CDB *q, int32_t equation, CDB *x);
+
+} // namespace qx
+
+#endif

@@ -1,0 +1,45 @@
+#ifndef QX_LINALG_EQUATIONS_SCHUR_FACTORS_H
+#define QX_LINALG_EQUATIONS_SCHUR_FACTORS_H
+
+#include "linalg/equations/panel.h"
+#include "linalg/factorisations/balance.h"
+
+namespace qx {
+
+// a = z t z^H with unitary z and (quasi-)triangular t, by our own iteration and so with the same
+// bits on every processor. What is below the norm's eps does not count, so the form is backward
+// stable for the norm of a and not for small parts of a graded matrix; strongly graded ones
+// converge for it. t has exact zeros below its diagonal, blocks of two aside.
+template <ElementType E>
+class SchurFactors {
+    typedef ElementOf<E> T;
+
+public:
+    // t() is a matrix of order n whose largest element is about 1, and becomes its Schur form.
+    // ErrOutOfMemory from either, ErrIterationLimit from compute().
+    ErrorCode allocate(int32_t n);
+    ErrorCode compute(double norm);
+    // The factors of a^H from those of a, with the rows and columns of t in reverse order, which
+    // keeps it upper triangular.
+    void setAdjoint(const SchurFactors &a);
+
+    const Panel<E> &t() const { return t_; }
+    const Panel<E> &adjoint() const { return adjoint_; } // z^H
+    CDB *values() const { return values_.data(); }
+
+private:
+    ErrorCode iterate(Balanced range, double negligible);
+    void clearBelowDiagonal();
+
+    int32_t n_ = 0;
+    Panel<E> t_, adjoint_;
+    Scratch<ElementType::CDB> values_;
+};
+
+// to = from^H for an n by n matrix.
+template <ElementType E>
+void CopyAdjoint(Part<ElementOf<E>> from, int32_t n, Part<ElementOf<E>> to);
+
+} // namespace qx
+
+#endif
