@@ -55,8 +55,9 @@ struct Given {
             std::frexp(largest, &exponent);
         return 0;
     }
-    void copyTo(Part<T> to) const {
-        const PowerOfTwo scale(-exponent);
+    // The scaled matrix times 2^further.
+    void copyTo(Part<T> to, int further = 0) const {
+        const PowerOfTwo scale(further - exponent);
         for (int32_t i = 0; i < rows; ++i)
             for (int32_t j = 0; j < cols; ++j) {
                 const auto element = scale.times(data[int64_t{i} * cols + j]);
@@ -78,6 +79,17 @@ double FrobeniusNorm(Part<T> a, int32_t rows, int32_t cols) {
         for (int32_t j = 0; j < cols; ++j)
             squares += SquaredModulus(a.data[i * a.stride + j]);
     return std::sqrt(squares);
+}
+
+template <class T>
+void AdjointInPlace(Part<T> a, int32_t n) {
+    for (int32_t i = 0; i < n; ++i)
+        for (int32_t j = 0; j <= i; ++j) {
+            T *const below = a.data + i * a.stride + j, *const above = a.data + j * a.stride + i;
+            const auto held = Conj(*below);
+            *below = Conj(*above);
+            *above = held;
+        }
 }
 
 template <ElementType E>
@@ -114,7 +126,9 @@ public:
         if (isSingular())
             return ErrSingularMatrix;
         c_.copyTo(PartOf(solution_));
-        growth_ = solveFactored();
+        growth_ = solveFactored(solution_);
+        if (products_)
+            refine();
         if (lyapunov_ && isHermitian())
             makeHermitian();
         return writeTo(x);
@@ -122,9 +136,10 @@ public:
 
 private:
     ErrorCode allocate() {
-        for (const ErrorCode failed : {sFactors_.allocate(m_), tFactors_.allocate(n_),
-                                       square_.allocate(std::max(m_, n_), std::max(m_, n_)),
-                                       solution_.allocate(m_, n_), work_.allocate(m_, n_)})
+        for (const ErrorCode failed :
+             {sFactors_.allocate(m_), tFactors_.allocate(n_),
+              square_.allocate(std::max(m_, n_), std::max(m_, n_)), solution_.allocate(m_, n_),
+              work_.allocate(m_, n_), products_ ? correction_.allocate(m_, n_) : 0})
             if (failed != 0)
                 return failed;
         return 0;
@@ -148,22 +163,22 @@ private:
     // A common power of two is taken from a and b in a sum; in a x b - x one is taken from the
     // larger of the two terms.
     void scaleTogether() {
-        int aExponent = 0, bExponent = 0; // of what the factors are still multiplied by
+        int bExponent = 0;
         if (products_) {
             const int both = a_.exponent + b_.exponent;
             equationExponent_ = std::max(both, 0);
             tau_ = std::ldexp(1.0, -equationExponent_);
-            aExponent = std::min(both, 0);
+            aExponent_ = std::min(both, 0);
         } else {
             equationExponent_ = a_.isZero   ? b_.exponent
                                 : b_.isZero ? a_.exponent
                                             : std::max(a_.exponent, b_.exponent);
-            aExponent = a_.isZero ? 0 : a_.exponent - equationExponent_;
+            aExponent_ = a_.isZero ? 0 : a_.exponent - equationExponent_;
             bExponent = b_.isZero ? 0 : b_.exponent - equationExponent_;
         }
-        Scale(sFactors_, m_, aExponent);
+        Scale(sFactors_, m_, aExponent_);
         Scale(tFactors_, n_, bExponent);
-        aNorm_ = std::ldexp(aNorm_, aExponent);
+        aNorm_ = std::ldexp(aNorm_, aExponent_);
         bNorm_ = std::ldexp(bNorm_, bExponent);
         norm_ = products_ ? aNorm_ * bNorm_ + tau_ : aNorm_ + bNorm_;
     }
@@ -180,10 +195,10 @@ private:
         return false;
     }
 
-    // The right side in solution_ becomes the solution, divided by the power of two whose exponent
+    // The right side in the panel becomes the solution, divided by the power of two whose exponent
     // is returned.
-    int solveFactored() const {
-        const Part<T> c = PartOf(solution_), work = PartOf(work_), square = PartOf(square_);
+    int solveFactored(const Panel<E> &panel) const {
+        const Part<T> c = PartOf(panel), work = PartOf(work_), square = PartOf(square_);
         const Part<T> zA = PartOf(sFactors_.adjoint()), zB = PartOf(tFactors_.adjoint());
         Multiply(m_, n_, m_, zA, c, work);
         CopyAdjoint<E>(zB, n_, square);
@@ -196,6 +211,32 @@ private:
         CopyAdjoint<E>(zA, m_, square);
         Multiply(m_, n_, m_, square, work, c);
         return growth;
+    }
+
+    // Adds the solution for the residual of a x b - x = c, which takes back what the products with
+    // four unitary matrices have cost in digits. Where that is no small correction, the equation is
+    // nearly singular and x stays.
+    void refine() const {
+        if (growth_ != 0)
+            return;
+        const Part<T> x = PartOf(solution_), residual = PartOf(correction_),
+                      square = PartOf(square_), work = PartOf(work_);
+        b_.copyTo(square);
+        if (lyapunov_)
+            AdjointInPlace(square, n_);
+        Multiply(m_, n_, n_, x, square, work);
+        a_.copyTo(square, aExponent_);
+        c_.copyTo(residual);
+        Subtract(m_, n_, m_, square, work, residual);
+        for (int32_t i = 0; i < m_; ++i)
+            for (int32_t j = 0; j < n_; ++j)
+                *correction_.at(i, j) += *solution_.at(i, j) * tau_;
+        const double size = FrobeniusNorm(x, m_, n_);
+        if (solveFactored(correction_) != 0 || !(FrobeniusNorm(residual, m_, n_) < 0.25 * size))
+            return;
+        for (int32_t i = 0; i < m_; ++i)
+            for (int32_t j = 0; j < n_; ++j)
+                *solution_.at(i, j) += *correction_.at(i, j);
     }
 
     bool isHermitian() const {
@@ -234,8 +275,9 @@ private:
     int32_t m_, n_;
     bool products_, lyapunov_;
     SchurFactors<E> sFactors_, tFactors_;
-    Panel<E> square_, solution_, work_;
+    Panel<E> square_, solution_, work_, correction_;
     double aNorm_ = 0.0, bNorm_ = 0.0, norm_ = 0.0, tau_ = 1.0;
+    int aExponent_ = 0; // the scaled a is still multiplied by this power of two
     int equationExponent_ = 0, growth_ = 0;
 };
 

@@ -19,7 +19,8 @@ enum LyapunovEquation : int32_t {
 // Through the Schur forms of a and b and back substitution by blocks (R. H. Bartels and G. W.
 // Stewart, 1972; for the products J. D. Gardiner, A. J. Laub, J. J. Amato and C. B. Moler,
 // "Solution of the Sylvester matrix equation AXB^T + CXD^T = E", 1992). Scaled by powers of two so
-// that nothing overflows but the result.
+// that nothing overflows but the result; with products, one
+// step of iterative refinement.
 //
 // ErrInvalidSelector, ErrNonFiniteInput, ErrIterationLimit, ErrSingularMatrix, ErrOverflow,
 // ErrOutOfMemory.
