@@ -14,9 +14,9 @@
    (|a| |b| + 1) |x| (eps 2.2e-16), for orders up to 200. How far that is from the x sought is a
    matter of the condition: where l + m (l - m, l m - 1) is small for eigenvalues l of a and m of b,
    x is large and its relative error is as well. The test for singular equations goes by the
-   norms of the whole matrices: with strongly graded ones, whose small eigenvalues are within rounding
-   errors of the norm, an equation is refused although its x may exist. Elements of any size are
-   accepted: nothing overflows but x itself. */
+   norms of the whole matrices: with strongly graded ones, whose small eigenvalues are within
+   rounding errors of the norm, an equation is refused although its x may exist. Elements of any
+   size are accepted: nothing overflows but x itself. */
 
 #include "qx/types.h"
 
