@@ -45,7 +45,6 @@ ErrorCode Lyapunov(const Array &a, const Array &q, int32_t equation, Array &x) {
 // The residual in long double, in units of eps (|a| + |b|) |x| or eps (|a| |b| + 1) |x|.
 double ResidualRatio(const Exact &a, const Exact &b, const Exact &c, int32_t equation,
                      const Exact &x) {
-    const Exact zero(c.rows(), c.cols());
     const Exact residual = equation == 0   ? a * x - (c - x * b)
                            : equation == 1 ? a * x - x * b - c
                                            : a * x * b - x - c;
