@@ -1,37 +1,12 @@
 #include "poly/common_divisor.h"
 
-#include "frame/constants.h"
 #include "linalg/factorisations/qr.h"
-#include "linalg/factorisations/reflector.h"
 #include "poly/complex_arithmetic.h"
 
 #include <algorithm>
 #include <cmath>
 
 namespace qx {
-
-namespace {
-
-constexpr auto Complex = ElementType::CDB;
-
-double Norm(const CDB *x, std::ptrdiff_t n) {
-    double sum = 0.0;
-    for (std::ptrdiff_t i = 0; i < n; ++i)
-        sum += SquaredModulus(x[i]);
-    return std::sqrt(sum);
-}
-
-// Coefficient i of the product of polynomials of these degrees.
-CDB ProductAt(std::ptrdiff_t i, const CDB *a, std::ptrdiff_t degreeA, const CDB *b,
-              std::ptrdiff_t degreeB) {
-    CDB sum = {};
-    for (std::ptrdiff_t j = std::max<std::ptrdiff_t>(0, i - degreeB); j <= std::min(i, degreeA);
-         ++j)
-        sum += a[j] * b[i - j];
-    return sum;
-}
-
-} // namespace
 
 ErrorCode LeastSquaresSystem::allocate(int64_t maxRows, int64_t maxCols) {
     if (const ErrorCode failed = augmented_.allocate(maxRows * (maxCols + 1)))
@@ -74,18 +49,12 @@ ErrorCode LeastSquaresSystem::solve(CDB *x) {
 }
 
 ErrorCode CommonDivisor::allocate(int32_t maxDegree) {
-    capacity_ = maxDegree;
     const int64_t n = maxDegree, size = 2 * n + 2;
-    for (const auto &[memory, count] : {std::pair(&sylvester_, 4 * n * n),
-                                        {&vectors_, 2 * size},
-                                        {&kappas_, size},
-                                        {&slope_, n},
-                                        {&unknowns_, size},
-                                        {&step_, size}})
-        if (const ErrorCode failed = memory->allocate(count))
-            return failed;
-    if (const ErrorCode failed = diagonal_.allocate(size))
+    if (const ErrorCode failed = sylvester_.allocate(2 * n, 2 * n))
         return failed;
+    for (Scratch<ElementType::CDB> *const memory : {&slope_, &unknowns_, &step_})
+        if (const ErrorCode failed = memory->allocate(memory == &slope_ ? n : size))
+            return failed;
     return system_.allocate(size, size);
 }
 
@@ -94,17 +63,14 @@ ErrorCode CommonDivisor::find(const CDB *p, int32_t n, int32_t largest, double t
     constexpr double trialFactor = 100.0;
     p_ = p;
     n_ = n;
-    columns_ = 0;
     quotientDegree_ = -1;
     for (int32_t i = 0; i < n; ++i)
         slope_[i] = p[i] * (double(n - i) / n);
-    const double threshold = trialFactor * tolerance * Norm(p, std::ptrdiff_t{n} + 1);
+    const double threshold = trialFactor * tolerance * CoefficientNorm(p, std::ptrdiff_t{n} + 1);
+    sylvester_.begin(p, n, slope_.data(), n - 1);
     for (int32_t k = 1; k <= std::min(largest, n - 1); ++k) {
-        if (k == 1)
-            appendColumn(slope_.data(), n - 1, 0, n + k);
-        appendColumn(slope_.data(), n - 1, k, n + k);
-        appendColumn(p, n, k - 1, n + k);
-        if (!(smallestSingularValue(columns_) <= threshold))
+        sylvester_.advance();
+        if (!(sylvester_.smallestSingularValue() <= threshold))
             continue;
         bool isDivisor = false;
         if (const ErrorCode failed = tryDegree(k, tolerance, &isDivisor))
@@ -124,71 +90,6 @@ ErrorCode CommonDivisor::find(const CDB *p, int32_t n, int32_t largest, double t
     return 0;
 }
 
-void CommonDivisor::appendColumn(const CDB *a, int32_t degree, int32_t shift, int32_t rows) {
-    CDB *const added = column(columns_);
-    for (std::ptrdiff_t i = 0; i < 2 * std::ptrdiff_t{capacity_}; ++i)
-        added[i] = i >= shift && i <= shift + degree ? a[i - shift] : CDB{};
-    for (std::ptrdiff_t j = 0; j < columns_; ++j) {
-        const CDB *const reflector = column(j);
-        if (IsZero(kappas_[j]))
-            continue;
-        CDB product = {};
-        for (std::ptrdiff_t i = j; i < rows; ++i)
-            product += Conj(reflector[i]) * added[i];
-        product = Quotient(product, kappas_[j]);
-        for (std::ptrdiff_t i = j; i < rows; ++i)
-            added[i] -= reflector[i] * product;
-    }
-    const Reflector<Complex> reflector(added + columns_, 1, rows - columns_,
-                                       Reflector<Complex>::Leave::Reduced);
-    kappas_[columns_] = reflector.kappa;
-    diagonal_[columns_] = reflector.beta;
-    ++columns_;
-}
-
-// Inverse iteration with R^H R. The singular vector is left in vectors_.
-double CommonDivisor::smallestSingularValue(int32_t cols) {
-    CDB *const x = vectors_.data(), *const y = x + cols;
-    for (int32_t i = 0; i < cols; ++i) // nothing that a structure could be orthogonal to
-        x[i] = {1.0 + i * 7 % 5 * 0.25, 0.0};
-    double value = kInfinity;
-    for (int32_t turn = 0; turn < 4; ++turn) {
-        solveAdjoint(cols, x, y);
-        const double before = Norm(y, cols);
-        for (int32_t i = 0; i < cols; ++i)
-            x[i] = y[i];
-        solveTriangle(cols, x);
-        const double after = Norm(x, cols);
-        value = before / after;
-        for (int32_t i = 0; i < cols; ++i)
-            x[i] = x[i] / after;
-    }
-    return value;
-}
-
-// Diagonal elements that vanish are as good as these.
-double CommonDivisor::pivot(std::ptrdiff_t i) const {
-    const double least = 1e-30 * std::fabs(diagonal_[0]);
-    return std::fabs(diagonal_[i]) > least ? double(diagonal_[i]) : least;
-}
-
-void CommonDivisor::solveAdjoint(int32_t cols, const CDB *x, CDB *y) const {
-    for (std::ptrdiff_t i = 0; i < cols; ++i) {
-        CDB sum = x[i];
-        for (std::ptrdiff_t j = 0; j < i; ++j)
-            sum -= Conj(column(i)[j]) * y[j];
-        y[i] = sum / pivot(i);
-    }
-}
-
-void CommonDivisor::solveTriangle(int32_t cols, CDB *x) const {
-    for (std::ptrdiff_t i = cols - 1; i >= 0; --i) {
-        x[i] = x[i] / pivot(i);
-        for (std::ptrdiff_t j = 0; j < i; ++j)
-            x[j] -= column(i)[j] * x[i];
-    }
-}
-
 ErrorCode CommonDivisor::tryDegree(int32_t k, double tolerance, bool *isDivisor) {
     degree_ = k;
     ErrorCode failed = firstGuess();
@@ -203,7 +104,7 @@ ErrorCode CommonDivisor::tryDegree(int32_t k, double tolerance, bool *isDivisor)
 // v and w from the vector that the Sylvester matrix maps to nearly 0, u by division.
 ErrorCode CommonDivisor::firstGuess() {
     const int32_t k = degree_, degreeOfU = n_ - k;
-    const CDB *const x = vectors_.data();
+    const CDB *const x = sylvester_.singularVector();
     v()[0] = {1.0, 0.0};
     for (std::ptrdiff_t s = 1; s <= k; ++s) {
         v()[s] = Quotient(x[2 * s - 1], x[0]);

@@ -3,6 +3,7 @@
 
 #include "frame/scratch.h"
 #include "linalg/scalar.h"
+#include "poly/sylvester_matrices.h"
 #include "qx/errors.h"
 #include "qx/types.h"
 
@@ -52,16 +53,6 @@ public:
     double error() const { return residual_; }
 
 private:
-    // The Sylvester matrix of step k has the products of p' / n by x^k ... 1 and of p by x^(k-1)
-    // ... 1 in its columns; it is triangular already from the columns of the steps before.
-    CDB *column(std::ptrdiff_t j) const { return &sylvester_[j * 2 * capacity_]; }
-    void appendColumn(const CDB *a, int32_t degree, int32_t shift, int32_t rows);
-    double smallestSingularValue(int32_t cols);
-    void solveAdjoint(int32_t cols, const CDB *x, CDB *y) const;
-    void solveTriangle(int32_t cols, CDB *x) const;
-
-    double pivot(std::ptrdiff_t i) const;
-
     ErrorCode tryDegree(int32_t k, double tolerance, bool *isDivisor);
     ErrorCode firstGuess();
     ErrorCode refine();
@@ -73,12 +64,11 @@ private:
     CDB *v() const { return u() + (n_ - degree_ + 1); }
     CDB *w() const { return v() + (degree_ + 1); }
 
-    int32_t capacity_ = 0, n_ = 0, degree_ = 0, columns_ = 0;
+    int32_t n_ = 0, degree_ = 0;
     int32_t quotientDegree_ = -1;
     double residual_ = 0.0;
     const CDB *p_ = nullptr;
-    Scratch<ElementType::CDB> sylvester_, vectors_, kappas_;
-    Scratch<ElementType::DBL> diagonal_;
+    SylvesterMatrices sylvester_;
     Scratch<ElementType::CDB> slope_, unknowns_, step_;
     LeastSquaresSystem system_;
 };

@@ -20,6 +20,8 @@ inline CDB Quotient(CDB a, CDB b) {
     return {(ratio * a.re + a.im) / denominator, (ratio * a.im - a.re) / denominator};
 }
 
+inline double Quotient(double a, double b) { return a / b; }
+
 inline double ScaledHypot(double a, double b) {
     a = std::fabs(a);
     b = std::fabs(b);
@@ -31,8 +33,10 @@ inline double ScaledHypot(double a, double b) {
 }
 inline double ScaledHypot(CDB z) { return ScaledHypot(z.re, z.im); }
 
+inline bool IsZero(double x) { return x == 0.0; }
 inline bool IsZero(CDB z) { return z.re == 0.0 && z.im == 0.0; }
 inline bool IsNaN(CDB z) { return z.re != z.re || z.im != z.im; }
+inline bool IsFinite(double x) { return std::isfinite(x); }
 inline bool IsFinite(CDB z) { return std::isfinite(z.re) && std::isfinite(z.im); }
 
 } // namespace qx

@@ -5,6 +5,7 @@
 #include "linalg/eigenproblems/general.h"
 #include "poly/common_divisor.h"
 #include "poly/complex_arithmetic.h"
+#include "poly/root_products.h"
 
 #include <algorithm>
 #include <cmath>
@@ -56,49 +57,6 @@ void RaiseNearest(const CDB *found, int32_t foundCount, int32_t level, const CDB
     }
 }
 
-// Coefficients of the product, to which a factor x - root is added at a time.
-class GrowingProduct {
-public:
-    GrowingProduct(CDB *coefficients) : a_(coefficients) { a_[0] = {1.0, 0.0}; }
-    GrowingProduct(CDB *coefficients, const GrowingProduct &other)
-        : a_(coefficients), degree_(other.degree_) {
-        for (int32_t i = 0; i <= degree_; ++i)
-            a_[i] = other.a_[i];
-    }
-    void multiply(CDB root) {
-        a_[degree_ + 1] = {};
-        for (int32_t i = degree_ + 1; i > 0; --i)
-            a_[i] -= root * a_[i - 1];
-        ++degree_;
-    }
-
-private:
-    CDB *a_;
-    int32_t degree_ = 0;
-};
-
-// Leja's order, in which factors keep the coefficients of their product accurate: each root
-// is the one farthest from those before it, by the product of the distances. `distances` is
-// work memory.
-void OrderForProducts(const CDB *roots, int32_t count, I32 *order, DBL *distances) {
-    for (int32_t j = 0; j < count; ++j) {
-        order[j] = j;
-        distances[j] = std::log(ScaledHypot(roots[j]));
-    }
-    for (int32_t i = 0; i < count; ++i) {
-        int32_t next = i;
-        for (int32_t j = i + 1; j < count; ++j)
-            if (distances[order[j]] > distances[order[next]])
-                next = j;
-        Swap(&order[i], &order[next]);
-        const CDB chosen = roots[order[i]];
-        for (int32_t j = i + 1; j < count; ++j) {
-            const double distance = std::log(ScaledHypot(roots[order[j]] - chosen));
-            distances[order[j]] = (i == 0 ? 0.0 : double(distances[order[j]])) + distance;
-        }
-    }
-}
-
 // The Gauss-Newton steps of PejorativeRefine.
 class RootRefinement {
 public:
@@ -117,7 +75,10 @@ public:
         Scratch<Real> distances;
         if (const ErrorCode failed = distances.allocate(count_))
             return failed;
-        OrderForProducts(roots_, count_, order_.data(), distances.data());
+        LejaOrder(
+            count_, [this](int32_t j) { return std::log(ScaledHypot(roots_[j])); },
+            [this](int32_t j, int32_t i) { return std::log(ScaledHypot(roots_[j] - roots_[i])); },
+            order_.data(), distances.data());
         return Merge(system_.allocate(degree_, count_), distances.release());
     }
 

@@ -1,0 +1,84 @@
+#include "poly/evaluation.h"
+
+#include "frame/scratch.h"
+#include "linalg/products/products.h"
+#include "linalg/scalar.h"
+#include "poly/arithmetic.h"
+
+#include <algorithm>
+#include <cmath>
+
+namespace qx {
+
+namespace {
+
+template <ElementType E>
+class MatrixPolynomial {
+    typedef ElementOf<E> T;
+
+public:
+    MatrixPolynomial(const T *p, int32_t n, const T *a, int32_t order)
+        : p_(p), a_(a), order_(order), elements_(std::ptrdiff_t{order} * order),
+          degree_(std::max(0, LengthWithoutZeros(p, n) - 1)) {}
+
+    ErrorCode evaluate(T *y) {
+        chooseBlocks();
+        if (const ErrorCode failed = work_.allocate(int64_t{powers_} * elements_))
+            return failed;
+        for (int32_t j = 2; j <= powers_; ++j)
+            OrderedProduct(power(j - 1), a_, order_, order_, order_, powerPlace(j));
+        for (std::ptrdiff_t i = 0; i < elements_; ++i)
+            y[i] = ScalarOf<E>::Of(0.0);
+        int32_t k = degree_ > 0 ? (degree_ - 1) / powers_ * powers_ : 0;
+        addBlock(k, degree_ - k, y);
+        for (k -= powers_; k >= 0; k -= powers_) {
+            T *const product = powerPlace(1); // the first power is a itself
+            OrderedProduct(y, power(powers_), order_, order_, order_, product);
+            for (std::ptrdiff_t i = 0; i < elements_; ++i)
+                y[i] = product[i];
+            addBlock(k, powers_ - 1, y);
+        }
+        return work_.release();
+    }
+
+private:
+    // The root of the degree makes the fewest products; the powers keep within 32 MB or eight
+    // matrices.
+    void chooseBlocks() {
+        const int64_t room = std::max<int64_t>(8, (int64_t{1} << 22) / elements_);
+        const int64_t best = static_cast<int64_t>(std::ceil(std::sqrt(double(degree_))));
+        powers_ = static_cast<int32_t>(std::clamp<int64_t>(best, 1, room));
+    }
+    T *powerPlace(int32_t j) { return work_.data() + (j - 1) * elements_; }
+    const T *power(int32_t j) { return j == 1 ? a_ : powerPlace(j); }
+
+    // Adds p[k] I + p[k + 1] a + ... + p[k + last] a^last.
+    void addBlock(int32_t k, int32_t last, T *y) {
+        for (int32_t j = 1; j <= last; ++j) {
+            const typename ScalarOf<E>::type factor = p_[k + j];
+            const T *const matrix = power(j);
+            for (std::ptrdiff_t i = 0; i < elements_; ++i)
+                y[i] = y[i] + factor * matrix[i];
+        }
+        for (std::ptrdiff_t i = 0; i < order_; ++i)
+            y[i * order_ + i] = y[i * order_ + i] + p_[k];
+    }
+
+    const T *p_;
+    const T *a_;
+    int32_t order_;
+    std::ptrdiff_t elements_;
+    int32_t degree_, powers_ = 1;
+    Scratch<E> work_;
+};
+
+} // namespace
+
+ErrorCode EvaluateAtMatrix(const DBL *p, int32_t n, const DBL *a, int32_t order, DBL *y) {
+    return MatrixPolynomial<ElementType::DBL>(p, n, a, order).evaluate(y);
+}
+ErrorCode EvaluateAtMatrix(const CDB *p, int32_t n, const CDB *a, int32_t order, CDB *y) {
+    return MatrixPolynomial<ElementType::CDB>(p, n, a, order).evaluate(y);
+}
+
+} // namespace qx
