@@ -8,7 +8,8 @@ quotient, remainder = qx.call("DividePolyH", p, q)
 print(quotient, remainder)
 
 #%% Derivatives, integrals and compositions
-print(qx.call("PolyDerivativeH", [1.0, 2.0, 3.0], 1), qx.call("PolyIntegralH", [1.0, 2.0, 3.0], 5.0))
+print(qx.call("PolyDerivativeH", [1.0, 2.0, 3.0], 1))
+print(qx.call("PolyIntegralH", [1.0, 2.0, 3.0], 5.0))
 print(qx.call("PolyComposeH", [1.0, 0.0, 1.0], [2.0, 1.0]))
 
 #%% A common factor in spite of rounded coefficients

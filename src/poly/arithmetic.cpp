@@ -4,7 +4,7 @@
 #include "frame/scratch.h"
 #include "linalg/scalar.h"
 #include "poly/complex_arithmetic.h"
-#include "spectra/convolution.h"
+#include "spectra/sliding_sums.h"
 
 #include <cmath>
 
@@ -20,6 +20,16 @@ int32_t Length(const ElementOf<E> *p, int32_t n) {
     while (n > 0 && IsZero(p[n - 1]))
         --n;
     return n;
+}
+
+// The window slides along the longer one; either way the index of p ascends.
+template <ElementType E>
+void Product(const ElementOf<E> *p, int32_t m, const ElementOf<E> *q, int32_t n, ElementOf<E> *r) {
+    const int32_t count = m + n - 1;
+    if (m < n)
+        SlidingSums({{p}, m, {q + (n - 1), -1}, n, 1 - int64_t{m}, {r + (count - 1), -1}, count});
+    else
+        SlidingSums({{q + (n - 1), -1}, n, {p}, m, 1 - int64_t{n}, {r}, count});
 }
 
 template <ElementType E>
@@ -71,8 +81,7 @@ ErrorCode ComposeAny(const ElementOf<E> *p, int32_t m, const ElementOf<E> *q, in
     r[0] = p[m - 1];
     int32_t length = 1;
     for (std::ptrdiff_t i = m - 2; i >= 0; --i) {
-        if (const ErrorCode failed = PolynomialProduct(r, length, q, n, work.data()))
-            return failed;
+        PolynomialProduct(r, length, q, n, work.data());
         length += n - 1;
         for (std::ptrdiff_t j = 0; j < length; ++j)
             r[j] = work[j];
@@ -86,18 +95,11 @@ ErrorCode ComposeAny(const ElementOf<E> *p, int32_t m, const ElementOf<E> *q, in
 int32_t LengthWithoutZeros(const DBL *p, int32_t n) { return Length<Real>(p, n); }
 int32_t LengthWithoutZeros(const CDB *p, int32_t n) { return Length<Complex>(p, n); }
 
-ErrorCode PolynomialProduct(const DBL *p, int32_t m, const DBL *q, int32_t n, DBL *r) {
-    return ConvolveReal(p, m, q, n, ConvolveDirectly, r);
+void PolynomialProduct(const DBL *p, int32_t m, const DBL *q, int32_t n, DBL *r) {
+    Product<Real>(p, m, q, n, r);
 }
-
-// Convolution's order of complex terms is another.
-ErrorCode PolynomialProduct(const CDB *p, int32_t m, const CDB *q, int32_t n, CDB *r) {
-    for (std::ptrdiff_t k = 0; k < std::ptrdiff_t{m} + n - 1; ++k)
-        r[k] = {};
-    for (std::ptrdiff_t i = 0; i < m; ++i)
-        for (std::ptrdiff_t j = 0; j < n; ++j)
-            r[i + j] += p[i] * q[j];
-    return 0;
+void PolynomialProduct(const CDB *p, int32_t m, const CDB *q, int32_t n, CDB *r) {
+    Product<Complex>(p, m, q, n, r);
 }
 
 void DivideInPlace(DBL *work, int32_t m, const DBL *q, int32_t n, DBL *quotient) {

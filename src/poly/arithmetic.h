@@ -15,9 +15,9 @@ namespace qx {
 int32_t LengthWithoutZeros(const DBL *p, int32_t n);
 int32_t LengthWithoutZeros(const CDB *p, int32_t n);
 
-// r, of m + n - 1 coefficients, is p q; m and n are at least 1. ErrOutOfMemory.
-ErrorCode PolynomialProduct(const DBL *p, int32_t m, const DBL *q, int32_t n, DBL *r);
-ErrorCode PolynomialProduct(const CDB *p, int32_t m, const CDB *q, int32_t n, CDB *r);
+// r, of m + n - 1 coefficients, is p q; m and n are at least 1.
+void PolynomialProduct(const DBL *p, int32_t m, const DBL *q, int32_t n, DBL *r);
+void PolynomialProduct(const CDB *p, int32_t m, const CDB *q, int32_t n, CDB *r);
 
 // For m >= n >= 1 and q[n - 1] other than 0. The quotient has m - n + 1 coefficients; `work`, which
 // holds p on entry, has the remainder in its first n - 1 ones at the end.

@@ -27,7 +27,7 @@ int64_t ElementsOf(const View &view) {
 }
 template <class View>
 bool IsAllFinite(const View &view) {
-    const auto *const elements = view.data();
+    const typename View::T *const elements = view.data();
     const int64_t count = ElementsOf(view);
     for (std::ptrdiff_t i = 0; i < count; ++i)
         if (!IsFinite(elements[i]))
@@ -88,9 +88,7 @@ Outcome Multiply(In<Handle> p, In<Handle> q, Out<Handle> r) {
         return ErrLengthTooLarge;
     if (const Outcome bad = r.resize(static_cast<int32_t>(length)))
         return bad;
-    if (const ErrorCode failed =
-            PolynomialProduct(p.data(), p.size(), q.data(), q.size(), r.data()))
-        return failed;
+    PolynomialProduct(p.data(), p.size(), q.data(), q.size(), r.data());
     return OverflowIn(r);
 }
 
@@ -244,17 +242,16 @@ Outcome CommonMultipleOf(In<DBL1D> p, In<DBL1D> q, double tolerance, Out<DBL1D> 
         other[i] = cofactor[degree - i].re / cofactor[0].re;
     if (const Outcome bad = lcm.resize(m + degree))
         return bad;
-    if (const ErrorCode failed = PolynomialProduct(monic, m, other, degree + 1, lcm.data()))
-        return failed;
+    PolynomialProduct(monic, m, other, degree + 1, lcm.data());
     return Merge(OverflowIn(lcm), work.release());
 }
 
-constexpr auto Evaluate = [](auto p, int32_t n, auto x, std::ptrdiff_t count, auto y) {
-    if constexpr (requires { p->re; })
-        EvaluateComplex(p, n, x, count, y);
-    else
-        EvaluateReal(p, n, x, count, y);
-};
+void Evaluate(const DBL *p, int32_t n, const DBL *x, std::ptrdiff_t count, DBL *y) {
+    EvaluateReal(p, n, x, count, y);
+}
+void Evaluate(const CDB *p, int32_t n, const CDB *x, std::ptrdiff_t count, CDB *y) {
+    EvaluateComplex(p, n, x, count, y);
+}
 
 template <class Handle>
 Outcome EvaluateAtPoints(In<Handle> p, In<Handle> x, Out<Handle> y) {

@@ -1,6 +1,6 @@
 """Writes docs/accuracy/polynomial_arithmetic.md: errors of the arithmetic of polynomials against
-mpmath with 100 digits, beside those of NumPy and SciPy on the same numbers. Run from the repository's
-root with the library built:
+mpmath with 100 digits, beside those of NumPy and SciPy on the same numbers. Run from the root of
+the repository with the library built:
 QX_LIBRARY_DIR=build/release PYTHONPATH=python /usr/bin/python3 \\
     src/poly/tests/data/make_polynomial_arithmetic.py"""
 
@@ -33,10 +33,12 @@ def value(coefficients, x):
 def evaluation():
     yield "## Values"
     yield ""
-    yield ("Points at distances of about 1e-1 to 1e-3 from the multiple root, 400 each; relative errors, and those of "
-           "PolyEv and CxPolyEv in units of eps + gamma(2n)^2 times the condition number, eps 2^-53.")
+    yield ("Points at distances of about 1e-1 to 1e-3 from the multiple root, 400 each; relative "
+           "errors, and those of PolyEv and CxPolyEv in units of eps + gamma(2n)^2 times the "
+           "condition number, eps 2^-53.")
     yield ""
-    yield "| Polynomial | largest condition | PolyEv or CxPolyEv | in units of the bound | numpy polyval |"
+    yield ("| Polynomial | largest condition | PolyEv or CxPolyEv | in units of the bound "
+           "| numpy polyval |")
     yield "|---|---|---|---|---|"
     random = np.random.default_rng(1)
     cases = [(f"(x - {root})^{n}", root, n) for root in (1, 1 + 1j) for n in (3, 5, 8, 12)]
@@ -93,11 +95,12 @@ def products_of_roots():
 def common_divisors():
     yield "## Common divisors"
     yield ""
-    yield ("Of 500 pairs each with random factors of degree 1 to 10 (coefficients normally distributed), "
-           "the divisor's coefficients relative to the largest: how many have the right degree, median and largest "
-           "error. Noise is relative to the coefficients' 2-norm.")
+    yield ("Of 500 pairs each with random factors of degree 1 to 10 (coefficients normally "
+           "distributed), how many divisors have the right degree, and the median and largest error "
+           "of their coefficients relative to the largest. Noise is relative to the 2-norm.")
     yield ""
-    yield "| Noise | tolerance | right degree | median error | largest error | largest distance / noise |"
+    yield ("| Noise | tolerance | right degree | median error | largest error "
+           "| largest distance / noise |")
     yield "|---|---|---|---|---|---|"
     for noise, tolerance in ((0, 1e-10), (1e-12, 1e-10), (1e-8, 1e-6), (1e-5, 1e-4)):
         random = np.random.default_rng(3)
@@ -134,8 +137,8 @@ def sum_of_fractions(part, poles, residues, x):
 def partial_fractions():
     yield "## Partial fractions"
     yield ""
-    yield ("The sum of the fractions against the quotient at 50 points, largest error relative to the sum "
-           "of the moduli of its terms; scipy.signal.residue with its tolerance 1e-3.")
+    yield ("The sum of the fractions against the quotient at 50 points, largest error relative to "
+           "the sum of the moduli of its terms; scipy.signal.residue with its tolerance 1e-3.")
     yield ""
     yield "| Denominator | PartialFractionsH | scipy residue |"
     yield "|---|---|---|"
