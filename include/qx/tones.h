@@ -1,0 +1,89 @@
+#ifndef QX_TONES_H
+#define QX_TONES_H
+
+/* Sinusoidal tones of a sampled signal, and the distortion and noise beside them.
+
+   A tone is amplitude cos(2 pi frequency t + phase), with t = 0 at the first sample: the amplitude
+   is that of the peak, the phase above -pi and at most pi. The samples lie dt apart, so that a
+   record of n samples tells frequencies in bins of 1 / (n dt).
+
+   Tones are found one after the other as the largest line in a windowed spectrum of what is left,
+   and all of them are then fitted to the samples together with a constant, by least squares: the
+   sine fit of IEEE Std 1057-2017 (four parameters) with more than one sine. In white noise that is
+   the estimate of maximum likelihood, whose deviations are those of the Cramer-Rao bound once the
+   tones stand out of the noise (D. C. Rife and R. R. Boorstyn, "Single tone parameter estimation from
+   discrete-time observations", 1974). Time grows with the samples, times the square of the number of
+   tones. Frequencies within a quarter of a bin of 0 and of half the sampling rate cannot be found. */
+
+#include "qx/types.h"
+
+QX_BEGIN_DECLS
+
+/** The `count` largest tones of y, or fewer: frequencies, amplitudes and phases by order: 0 by
+    falling amplitude; 1 by rising frequency. *residualRms is the root mean square of what the tones
+    and the constant leave. The search ends early where the largest line left is below 1e-12 of the
+    largest tone or could be noise (which white noise alone passes about once in 10^4 records), or
+    where the samples have no more than three parameters a tone and the constant. The largest tone of
+    all is given even where it may be noise. Tones half a bin apart are told from each other where the
+    noise allows it, which at this distance asks for 40 dB more than at two bins.
+    Codes: ErrMeasureEmpty (y is empty), ErrSamplingNotPositive (dt is not a positive finite number),
+    ErrMeasureBadCount (count is below 1), ErrInvalidSelector (order), ErrNonFiniteInput (y),
+    ErrMeasureTooFewPoints (fewer than 4 samples), ErrMeasureNotFound (nothing but a constant),
+    ErrOutOfMemory (no memory, or an array cannot be resized). */
+QX_API ErrorCode MultipleToneMeasurements(QX_IN DBL1D y, double dt, int32_t count, int32_t order,
+                                          QX_OUT DBL1D frequencies, QX_OUT DBL1D amplitudes,
+                                          QX_OUT DBL1D phases, QX_OUT double *residualRms);
+
+/** The largest tone whose frequency is within halfWidth of `centre`; where halfWidth is not above 0,
+    the largest of all. *offset is the constant, *residualRms the root mean square of what the tone
+    and the constant leave; other tones are part of it. Larger tones outside the band, up to eight, are
+    fitted along, so that they do not disturb; smaller ones do, by about their amplitude over pi times
+    the distance in bins: MultipleToneMeasurements fits them all. In a band, a line that could be
+    noise does not count.
+    Codes: ErrMeasureEmpty (y is empty), ErrSamplingNotPositive (dt is not a positive finite number),
+    ErrNonFiniteInput (y, centre or halfWidth), ErrMeasureTooFewPoints (fewer than 4 samples),
+    ErrMeasureNotFound (nothing but a constant, or nothing in the band), ErrOutOfMemory (no memory). */
+QX_API ErrorCode SingleToneMeasurement(QX_IN DBL1D y, double dt, double centre, double halfWidth,
+                                       QX_OUT double *frequency, QX_OUT double *amplitude,
+                                       QX_OUT double *phase, QX_OUT double *offset,
+                                       QX_OUT double *residualRms);
+
+/** A tone, its harmonics and what is left, by the definitions of IEEE Std 1241-2010 and 1057-2017. The
+    largest tone within 2 bins or 1 % of `fundamental`, or of all where `fundamental` is not above 0,
+    and its multiples up to highestHarmonic are fitted together, with one frequency for all.
+    `fundamental` may exceed half the sampling rate.
+
+    Index 0 of frequencies, amplitudes and phases is the fundamental, index h - 1 harmonic h. Each is
+    given where it is seen, which beyond half the sampling rate 1 / dt is |h f - m / dt| with the
+    nearest integer m. A harmonic is NaN in all three where it is seen within half a bin of 0, of half
+    the sampling rate or of another harmonic (then both are) or the fundamental: its amplitude cannot
+    be told. What is seen of it still counts as distortion, once, but for what falls on 0 or on the
+    fundamental.
+
+    With A the amplitude of the fundamental, D the root of the sum of the squared amplitudes of the
+    harmonics, and root mean squares of what is left:
+
+        *thd         D / A, a ratio
+        *sinad       20 log10 of A / sqrt(2) over what constant and fundamental leave, in dB
+        *snr         the same over what the harmonics leave, too
+        *sfdr        20 log10 of A over the amplitude of the largest other line, harmonic or not
+        *enob        (*sinad + 20 log10(F / A) - 1.7609) / 6.0206, where F is fullScale, the peak of a
+                     sine at full scale, or A where fullScale is not above 0
+        *noiseFloor  - *snr - 10 log10(n / 2): noise in each bin relative to the fundamental, in dB
+
+    Where nothing is left these are infinite.
+    Codes: ErrMeasureEmpty (y is empty), ErrSamplingNotPositive (dt is not a positive finite number),
+    ErrMeasureBadCount (highestHarmonic is below 1), ErrNonFiniteInput (y, fundamental or fullScale),
+    ErrMeasureTooFewPoints (fewer than 4 samples, or than 2 highestHarmonic + 2), ErrMeasureNotFound
+    (nothing but a constant, or no tone near `fundamental`), ErrOutOfMemory (no memory, or an array
+    cannot be resized). */
+QX_API ErrorCode HarmonicAnalysis(QX_IN DBL1D y, double dt, double fundamental,
+                                  int32_t highestHarmonic, double fullScale,
+                                  QX_OUT DBL1D frequencies, QX_OUT DBL1D amplitudes,
+                                  QX_OUT DBL1D phases, QX_OUT double *thd, QX_OUT double *sinad,
+                                  QX_OUT double *snr, QX_OUT double *sfdr, QX_OUT double *enob,
+                                  QX_OUT double *noiseFloor);
+
+QX_END_DECLS
+
+#endif

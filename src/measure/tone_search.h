@@ -1,0 +1,85 @@
+#ifndef QX_MEASURE_TONE_SEARCH_H
+#define QX_MEASURE_TONE_SEARCH_H
+
+#include "fft/plan.h"
+#include "frame/scratch.h"
+#include "measure/sinusoids.h"
+#include "qx/errors.h"
+#include "qx/types.h"
+
+#include <cstdint>
+#include <optional>
+
+namespace qx {
+
+// A band of frequencies in cycles per sample.
+struct Band {
+    double low, high;
+    bool contains(double frequency) const { return frequency >= low && frequency <= high; }
+};
+constexpr Band wholeBand = {0.0, 0.5};
+
+// Tones of a record, found one after the other as the largest line in the spectrum of what the
+// former have left, and fitted together.
+class ToneSearch {
+public:
+    // At least 4 finite samples. ErrMeasureNotFound (nothing but a constant), ErrOutOfMemory.
+    ErrorCode begin(const DBL *y, int32_t n);
+
+    enum class Step {
+        Added,
+        OnlyNoise, // the largest line of the band is not above the noise, and was not added
+        Exhausted  // nothing above the rounding is left, or as many tones as the samples can tell
+    };
+    // Adds the largest line of the band; the first one of all, and one `evenInNoise`, also where
+    // noise alone could have made it. ErrOutOfMemory.
+    ErrorCode add(const Band &band, bool evenInNoise, Step &step);
+
+    int32_t count() const { return count_; }
+    const Line &operator[](int32_t i) const { return lines()[i]; }
+    double constant() const { return constant_; }
+
+    // Fits the tones to the last digits, when all are found.
+    void settle();
+    // Lines that share their frequencies, from here on in the place of the tones; fitted.
+    ErrorCode replace(const Line *lines, int32_t count, int32_t groups);
+    // The root mean square of what constant and tones leave; residual, if not null, gets all of it.
+    double residualRms(DBL *residual);
+    // The same without the tones but the first `count`, or but this one.
+    double residualRmsOf(int32_t count);
+    double residualRmsOf(const Line &tone);
+
+    // The samples are measured in this unit, a power of 2, from this level.
+    double unit() const { return unit_; }
+    double level() const { return level_; }
+
+private:
+    struct Peak {
+        double frequency, amplitude;
+        double overNoise; // of its power
+    };
+    struct State {
+        double constant, squares;
+    };
+
+    Line *lines() const { return static_cast<Line *>(lineMemory_.bytes()); }
+    Line *former() const { return lines() + capacity_; }
+    Line *best() const { return former() + capacity_; }
+    ErrorCode reserve(int32_t count, int32_t groups);
+    ErrorCode largestLine(const Band &band, Peak &peak);
+    void fitFrom(double frequency, int32_t split, double offset, State &least);
+    bool isAboveNoise(const Peak &peak, double squaresBefore) const;
+
+    int32_t n_ = 0;
+    double unit_ = 1, level_ = 0;
+    Scratch<ElementType::DBL> samples_;
+    SinusoidFit fit_;
+    std::optional<PlanReference> plan_;
+    ScratchBytes lineMemory_;
+    int32_t count_ = 0, capacity_ = 0;
+    double constant_ = 0, squares_ = 0;
+};
+
+} // namespace qx
+
+#endif
