@@ -20,7 +20,7 @@ typedef struct TriggerState {
     double last; /* the latest sample, where hasLast is not 0 */
 } TriggerState;
 
-/** The next trigger in a block of a stream, from sample `start` on, by slope: 0 rising; 1 falling; 2
+/** The next trigger in a block of a stream, from sample `start` on. slope: 0 rising; 1 falling; 2
     either, each armed for itself. *index is the sample that triggers, within the block, -1 where
     there is none. *position is where the line from the sample before it to that one passes the level,
     from *index - 1 to *index, so between -1 and 0 where they lie in two blocks; it is *index where

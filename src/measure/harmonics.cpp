@@ -92,7 +92,7 @@ ErrorCode LargestSpur(const DBL *residual, int32_t n, double &amplitude) {
 } // namespace
 
 ErrorCode FindToneInBand(ToneSearch &search, const Band &band) {
-    constexpr int32_t mostOutside = 8;
+    constexpr int32_t mostOutside = 32;
     const bool isWhole = band.low <= 0 && band.high >= 0.5;
     for (int32_t k = 0; k <= mostOutside; ++k) {
         ToneSearch::Step step;
