@@ -47,6 +47,7 @@ np.savetxt("decay.csv", np.column_stack([x, 3 * np.exp(-x / 2)]), delimiter=",",
 soundfile.write("IN.wav", 0.5 * np.sin(0.05 * np.arange(48000)), 48000)
 """
 NAMES = {"peaks FILE": "peaks measurement.csv", "pulse FILE": "pulse measurement.csv",
+         "tones FILE": "tones measurement.csv",
          "fit FILE": "fit decay.csv"}
 
 # What must hold after a command that begins so, as a command of its own.

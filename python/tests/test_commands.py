@@ -71,6 +71,8 @@ WRITING = (  # arguments, what is written, whether the command replaces what it 
     (("fit", ECG, "--model", "line", "--plot", "line.png"), "line.png", False),
     (("peaks", ECG, "--csv", "peaks.csv"), "peaks.csv", False),
     (("pulse", ECG, "--events", "--csv", "pulses.csv"), "pulses.csv", False),
+    (("tones", ECG), "out/tones.svg", True),
+    (("tones", ECG, "--csv", "tones.csv"), "tones.csv", False),
     (("generate", "sine", "sine.csv"), "sine.csv", False),
     (("generate", "sine", "sine.wav"), "sine.wav", False),
     (("resample", "in.wav", "out.flac", "--rate", "8000"), "out.flac", False))

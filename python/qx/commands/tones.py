@@ -1,0 +1,77 @@
+"""The command tones."""
+
+import os
+
+from ..outputs import add_force
+from . import reading
+from .measure import number, show_table, write_table
+from .values import add_command, positive
+
+EXAMPLES = """\
+examples:
+  python3 -m qx generate sine tone.wav --rate 48000 --frequency 997
+  python3 -m qx tones tone.wav
+  python3 -m qx tones tone.wav --harmonics 5 --full-scale 1 --csv tones.csv
+  python3 -m qx tones examples/data/ecg_208_360hz.csv --count 8 --plot hum.svg
+
+Harmonics are those of the largest tone, or of the one near --fundamental. THD, SINAD, SNR and ENOB follow
+IEEE 1241. A drawing of an earlier run (SVG) is replaced; other files of that name only with --force."""
+
+
+def tones(options):
+    from .. import outputs, recording
+    from .. import tones as topic
+    path = options.plot or os.path.join("out", "tones.svg")
+    inputs = outputs.identities([options.file])
+    outputs.check(path, options.force, "tones", inputs)
+    if options.csv:
+        outputs.check(options.csv, options.force, inputs=inputs)
+    read = recording.read(options.file, **reading.of(options))
+    print(f"{read.name}: {read.choice}")
+    rate = read.rate or 1.0
+    found = topic.tones(read.values, rate, options.count)
+    analysis = topic.harmonics(read.values, rate, options.harmonics, options.fundamental or 0.0,
+                               options.full_scale or 0.0)
+
+    frequency = "frequency (Hz)" if read.rate else "frequency (1/sample)"
+    amplitude = f"amplitude ({read.unit})" if read.unit else "amplitude"
+    names = [frequency, amplitude, "phase (rad)"]
+    many = len(found.frequencies)
+    print(f"{many} tone{'s' * (many != 1)}, which leave {found.residual_rms:.6g} {read.unit}".rstrip()
+          + " (root mean square)")
+    show_table(names, list(zip(found.frequencies, found.amplitudes, found.phases)))
+    print("Harmonics")
+    rows = [(h, *row) for h, row in enumerate(zip(analysis.frequencies, analysis.amplitudes,
+                                                  analysis.phases), 1)]
+    show_table(["harmonic", *names], rows)
+    for label, value, unit in (("THD", 100 * analysis.thd, "%"), ("SINAD", analysis.sinad, "dB"),
+                               ("SNR", analysis.snr, "dB"), ("SFDR", analysis.sfdr, "dB"),
+                               ("ENOB", analysis.enob, "bits"),
+                               ("noise in a bin", analysis.noise_floor, "dB of the fundamental")):
+        print(f"  {label:<16} {value:>10.6g} {unit}")
+    if options.csv:
+        write_table(options.csv, ["kind", "number", *names],
+                    [("tone", i, *row) for i, row in enumerate(
+                        zip(found.frequencies, found.amplitudes, found.phases), 1)]
+                    + [("harmonic", *row) for row in rows])
+    topic.plot(read, found, analysis, path)
+    print(f"Spectrum with tones and harmonics: {path}")
+
+
+def add(commands):
+    command = add_command(
+        commands, "tones", EXAMPLES, help="measures tones, harmonics and noise of a recording",
+        description="Measures the tones of a recording, and harmonics, distortion and noise.")
+    command.add_argument("file")
+    command.add_argument("--count", type=number, default=5, metavar="N",
+                         help="so many tones at most, 5 by default; fewer where the rest could be noise")
+    command.add_argument("--fundamental", type=positive, metavar="HZ",
+                         help="about where the tone is whose harmonics are measured; the largest by default")
+    command.add_argument("--harmonics", type=number, default=10, metavar="N", help="up to this one, 10 by default")
+    command.add_argument("--full-scale", type=positive, metavar="VALUE",
+                         help="amplitude of a sine at full scale, for ENOB; that of the tone by default")
+    reading.missing(reading.add_options(command), "interpolate")
+    command.add_argument("--csv", metavar="FILE", help="writes both tables there")
+    command.add_argument("--plot", metavar="FILE", help="out/tones.svg by default; .png and .pdf, too")
+    add_force(command)
+    command.set_defaults(run=tones)

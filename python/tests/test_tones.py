@@ -1,0 +1,97 @@
+"""Tones, harmonics and triggers: the topic, the command, streams."""
+
+import contextlib
+import csv
+import io
+import os
+import sys
+import tempfile
+import unittest
+from pathlib import Path
+
+import numpy as np
+
+sys.path.insert(0, str(Path(__file__).resolve().parent.parent))
+import qx  # noqa: E402
+from qx import __main__ as command, tones  # noqa: E402
+
+RATE = 1000.0
+T = np.arange(4000) / RATE
+SIGNAL = 2 * np.cos(2 * np.pi * 50 * T + 1) + 0.02 * np.cos(2 * np.pi * 150 * T) + 0.1 * np.cos(2 * np.pi * 83.3 * T)
+
+
+class Topic(unittest.TestCase):
+    def test_the_largest_come_first_and_harmonics_end_with_the_samples(self):
+        found = tones.tones(SIGNAL, RATE, 3)
+        np.testing.assert_allclose(found.frequencies, [50, 83.3, 150], rtol=1e-9)
+        np.testing.assert_allclose(found.amplitudes, [2, 0.1, 0.02], rtol=1e-9)
+        analysis = tones.harmonics(SIGNAL, RATE, 3)
+        self.assertAlmostEqual(analysis.thd, 0.01, 4)
+        self.assertAlmostEqual(analysis.sfdr, 20 * np.log10(20), 2)
+        self.assertEqual(len(tones.harmonics(SIGNAL[:20], RATE, 100).frequencies), 9)
+
+    def test_lines_of_the_spectrum_have_the_amplitudes_of_tones(self):
+        frequencies, amplitudes = tones.spectrum(SIGNAL + 5)
+        self.assertAlmostEqual(amplitudes[np.argmin(np.abs(RATE * frequencies - 50))], 2, 6)
+        away = np.abs(RATE * frequencies[:, None] - [0, 50, 83.3, 150]).min(1) > 5
+        self.assertLess(amplitudes[away].max(), 1e-7)
+
+    def test_a_trigger_goes_through_blocks_with_its_state(self):
+        whole, state = [], {}
+        for size in (len(SIGNAL), 1, 7):
+            state, places = {}, []
+            for first in range(0, 500, size):
+                block, index = SIGNAL[:500][first:first + size], -1
+                while True:
+                    state, index, position = qx.Triggerh_86(block, 0.5, 0.3, 2, index + 1, 2, state)
+                    if index < 0:
+                        break
+                    places.append(first + position)
+            whole = whole or places
+            np.testing.assert_allclose(places, whole, atol=1e-12)
+        self.assertEqual(len(whole), 50)
+        with self.assertRaisesRegex(ValueError, "slope: 3 .* 0 rising; 1 falling"):
+            qx.Triggerh(SIGNAL, 0.0, 3, 0)
+
+
+class Command(unittest.TestCase):
+    def setUp(self):
+        folder = tempfile.TemporaryDirectory()
+        self.addCleanup(folder.cleanup)
+        self.addCleanup(os.chdir, os.getcwd())
+        os.chdir(folder.name)
+
+    def run_command(self, *arguments):
+        out = io.TextIOWrapper(io.BytesIO(), "utf-8", write_through=True)
+        with contextlib.redirect_stdout(out), contextlib.redirect_stderr(out):
+            code = command.main(["tones", *arguments])
+        return code, out.buffer.getvalue().decode()
+
+    def test_prints_and_plots_tones_and_harmonics(self):
+        np.savetxt("signal.csv", np.column_stack([T, SIGNAL]), delimiter=",", header="time (s),U (V)", comments="")
+        code, text = self.run_command("signal.csv", "--count", "3", "--harmonics", "3", "--csv", "tones.csv")
+        self.assertEqual(code, 0, text)
+        for words in ("3 tones", "frequency (Hz)", "amplitude (V)", "THD", "SINAD", "ENOB"):
+            self.assertIn(words, text)
+        self.assertIn("harmonics", Path("out/tones.svg").read_text())
+        with open("tones.csv", newline="") as file:
+            rows = list(csv.reader(file))
+        self.assertEqual([row[:2] for row in rows[1:]], [[kind, str(i)] for kind in ("tone", "harmonic")
+                                                         for i in (1, 2, 3)])
+        self.assertAlmostEqual(float(rows[2][2]), 83.3, 6)
+
+    def test_says_where_there_is_nothing_to_measure(self):
+        Path("constant.csv").write_text("5\n" * 40)
+        for arguments, words in ((("constant.csv",), "ErrMeasureNotFound"), (("none.csv",), "none.csv"),
+                                 (("constant.csv", "--count", "0"), None)):
+            try:
+                code, text = self.run_command(*arguments)
+            except SystemExit as refused:
+                code, text = refused.code, ""
+            self.assertEqual(code, 2)
+            self.assertIn(words or "", text)
+            self.assertFalse(Path("out/tones.svg").exists())
+
+
+if __name__ == "__main__":
+    unittest.main()
