@@ -1,14 +1,17 @@
-// The window scan of the peak detector, and the search for crossings.
+// The window scan of the peak detector, the searches for crossings, triggers and tones.
 //
 // Peers: for the scan three plain dot products for each window, as the definition has them; for
 // crossings the time in which the same data are read and summed, and the plain loop over the
-// samples.
+// samples; for triggers the reading; for tones one transform of the padded record a tone.
 
 #include "bench/host_memory.h"
 #include "bench/timing.h"
+#include "fft/plan.h"
 #include "measure/crossings.h"
 #include "measure/parabolas.h"
 #include "measure/peaks.h"
+#include "measure/tone_search.h"
+#include "measure/trigger.h"
 
 #include <cmath>
 #include <cstdint>
@@ -135,10 +138,73 @@ void Crossings() {
     overPlain.summary("loop over the samples");
 }
 
+void Triggers() {
+    Ratios over("search for triggers");
+    constexpr int32_t n = 1000000;
+    const HostMemory y(n);
+    for (const int32_t every : {20, 300, 10000}) {
+        for (int32_t i = 0; i < n; ++i)
+            y.data()[i] = std::sin(std::numbers::pi * (i + 0.5) / every) + 1e-3 * Noise(i);
+        const auto [ours, reading] = LeastTimes(
+            [&] {
+                TriggerState state = {};
+                qx::TriggerHit hit = {-1, 0};
+                do
+                    qx::FindTrigger(y.data(), n, hit.index + 1, {0, 0.5, qx::EitherSlope, 0}, state,
+                                    hit);
+                while (hit.index >= 0);
+                Keep(hit.index);
+            },
+            [&] { Keep(SumInVectors(y.data(), n)); });
+        std::printf("triggers one in %6d %7.3f ns a sample  reading %5.2f\n", every,
+                    ours / n * 1e9, ours / reading);
+        over.add(ours / reading, "one in " + std::to_string(every));
+    }
+    over.summary("sum of the data in vectors");
+}
+
+void Tones() {
+    Ratios over("search for tones");
+    for (const int32_t n : {1024, 65536, 1048576}) {
+        const HostMemory y(n), padded(2 * n), spectrum(2 * n);
+        Fill(padded.data(), 2 * n, Noise);
+        const qx::PlanReference plan(2 * n);
+        for (const int32_t count : {1, 3, 10}) {
+            for (int32_t i = 0; i < n; ++i) {
+                y.data()[i] = 1e-3 * Noise(i);
+                for (int32_t k = 0; k < count; ++k)
+                    y.data()[i] += std::cos((0.1 + 0.2718 * k) * i) / (k + 1);
+            }
+            const auto [ours, transforms] = LeastTimes(
+                [&] {
+                    qx::ToneSearch search;
+                    search.begin(y.data(), n);
+                    qx::ToneSearch::Step step;
+                    while (search.count() < count)
+                        search.add(qx::wholeBand, true, step);
+                    search.settle();
+                    Keep(search[0].frequency);
+                },
+                [&] {
+                    for (int32_t k = 0; k < count; ++k)
+                        qx::FFTRealForward(plan.get(), padded.data(), spectrum.data(), 1, 1, 2 * n);
+                    Keep(spectrum.data()[1]);
+                });
+            std::printf("tones n %8d, %2d tones %10.3f ms  transforms %5.2f\n", n, count,
+                        ours * 1e3, ours / transforms);
+            over.add(ours / transforms,
+                     std::to_string(n) + ", " + std::to_string(count) + " tones");
+        }
+    }
+    over.summary("a transform of twice the length for each tone");
+}
+
 } // namespace
 
 int main() {
     Scans();
     Crossings();
+    Triggers();
+    Tones();
     return 0;
 }
