@@ -156,8 +156,8 @@ void Triggers() {
                 Keep(hit.index);
             },
             [&] { Keep(SumInVectors(y.data(), n)); });
-        std::printf("triggers one in %6d %7.3f ns a sample  reading %5.2f\n", every,
-                    ours / n * 1e9, ours / reading);
+        std::printf("triggers one in %6d %7.3f ns a sample  reading %5.2f\n", every, ours / n * 1e9,
+                    ours / reading);
         over.add(ours / reading, "one in " + std::to_string(every));
     }
     over.summary("sum of the data in vectors");

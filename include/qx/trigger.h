@@ -3,9 +3,9 @@
 
 /* Where a signal passes a level, in one array or in a stream that comes in blocks of any size.
 
-   A rising trigger is armed by a sample strictly below level - hysteresis, and triggers at the first
-   sample at or above level; it must then be armed again. A falling one is armed strictly above
-   level + hysteresis and triggers at or below level. */
+   A rising trigger is armed by a sample strictly below level - hysteresis, and triggers at the
+   first sample at or above level; it must then be armed again. A falling one is armed strictly
+   above level + hysteresis and triggers at or below level. */
 
 #include "qx/types.h"
 
@@ -22,10 +22,10 @@ typedef struct TriggerState {
 
 /** The next trigger in a block of a stream, from sample `start` on. slope: 0 rising; 1 falling; 2
     either, each armed for itself. *index is the sample that triggers, within the block, -1 where
-    there is none. *position is where the line from the sample before it to that one passes the level,
-    from *index - 1 to *index, so between -1 and 0 where they lie in two blocks; it is *index where
-    there is no sample before it or where that lies at or beyond the level already (after a holdoff),
-    and NaN where nothing triggers.
+    there is none. *position is where the line from the sample before it to that one passes the
+    level, from *index - 1 to *index, so between -1 and 0 where they lie in two blocks; it is *index
+    where there is no sample before it or where that lies at or beyond the level already (after a
+    holdoff), and NaN where nothing triggers.
 
     The state is that behind the sample that triggers, else behind the block; to go on in the same
     block, start at *index + 1. The `holdoff` samples behind one that triggers neither trigger nor
@@ -36,8 +36,8 @@ typedef struct TriggerState {
     A failure gives -1 and NaN and leaves the state as it was.
     Codes: ErrMeasureEmpty (y is empty), ErrInvalidSelector (slope), ErrIndexOutOfRange (start is
     below 0 or above the size of y, which itself finds nothing), ErrNegativeSetting (hysteresis or
-    holdoff is negative, or hysteresis is NaN), ErrNonFiniteInput (level, hysteresis, or a sample that
-    is looked at). */
+    holdoff is negative, or hysteresis is NaN), ErrNonFiniteInput (level, hysteresis, or a sample
+    that is looked at). */
 QX_API ErrorCode Triggerh_86(QX_IN DBL1D y, double level, double hysteresis, int32_t slope,
                              int32_t start, int32_t holdoff, QX_INOUT TriggerState *state,
                              QX_OUT int32_t *index, QX_OUT double *position);

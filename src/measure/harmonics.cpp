@@ -50,8 +50,7 @@ void SeenHarmonics::lay(const Line &fundamental, int32_t n, int32_t highest) {
             seen.slope = 0;
         }
         int32_t same = 0;
-        while (same < count_ &&
-               std::fabs(lines()[same].frequency - seen.frequency) >= halfBin)
+        while (same < count_ && std::fabs(lines()[same].frequency - seen.frequency) >= halfBin)
             ++same;
         if (same == count_) {
             lines()[count_] = seen;

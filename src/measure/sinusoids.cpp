@@ -202,10 +202,9 @@ void SinusoidFit::buildNormal(const Line *lines, int32_t count, int32_t groups) 
             const double toQ = q.slope * unit;
             normal_[at(firstGroup + q.group, 1 + 2 * l)] -= toQ * q.cosine * ofCosine;
             normal_[at(firstGroup + q.group, 2 + 2 * l)] += toQ * q.sine * ofSine;
-            const double both =
-                toP * toQ * 0.5 *
-                (p.cosine * q.cosine * (less.squares - more.squares) +
-                 p.sine * q.sine * (less.squares + more.squares));
+            const double both = toP * toQ * 0.5 *
+                                (p.cosine * q.cosine * (less.squares - more.squares) +
+                                 p.sine * q.sine * (less.squares + more.squares));
             normal_[at(firstGroup + p.group, firstGroup + q.group)] += both;
             if (m == l)
                 continue;
@@ -318,8 +317,8 @@ double SinusoidFit::refine(Line *lines, int32_t count, int32_t groups, double se
                 for (int32_t i = 0; i < size; ++i)
                     promised += step_[i] * gradient_[i];
                 if (takeStep(lines, count, groups, trial_))
-                    trialSquares = sumOfSquares(trial_, count, constant + step_[0], trialMoments_,
-                                                nullptr);
+                    trialSquares =
+                        sumOfSquares(trial_, count, constant + step_[0], trialMoments_, nullptr);
             }
             if (trialSquares < squares) {
                 squares = trialSquares;

@@ -8,9 +8,9 @@
 
 namespace qx {
 
-// A line of a record of n samples: cosine cos(2 pi frequency s) + sine sin(2 pi frequency s), with s
-// the sample number counted from the middle of the record, (n - 1) / 2, and the frequency in cycles
-// per sample.
+// A line of a record of n samples: cosine cos(2 pi frequency s) + sine sin(2 pi frequency s), with
+// s the sample number counted from the middle of the record, (n - 1) / 2, and the frequency in
+// cycles per sample.
 //
 // The lines of a group move together: where the group's frequency changes by d, that of a line
 // changes by slope d. Tones have a group each and slope 1, harmonics are one group.
@@ -41,8 +41,8 @@ public:
     // ErrOutOfMemory.
     ErrorCode reserve(int32_t lines, int32_t groups);
 
-    // Moves the lines and the constant from where they are to the least squares nearby, until a step
-    // takes less than the part `settled` of the sum of squares. What is left of that.
+    // Moves the lines and the constant from where they are to the least squares nearby, until a
+    // step takes less than the part `settled` of the sum of squares. What is left of that.
     double refine(Line *lines, int32_t count, int32_t groups, double settled, double &constant);
 
     // What is left of the samples, and the sum of its squares; residual may be null.

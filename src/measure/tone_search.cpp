@@ -106,7 +106,8 @@ ErrorCode ToneSearch::largestLine(const Band &band, Peak &peak) {
         plan_.emplace(m);
     if (!*plan_)
         return ErrOutOfMemory;
-    if (const ErrorCode failed = FFTRealForward(plan_->get(), work.data(), spectrum.data(), 1, 1, m))
+    if (const ErrorCode failed =
+            FFTRealForward(plan_->get(), work.data(), spectrum.data(), 1, 1, m))
         return failed;
 
     DBL *const power = work.data();
@@ -155,9 +156,9 @@ void ToneSearch::fitFrom(double frequency, int32_t split, double offset, State &
     std::copy(lines(), lines() + count_ + 1, best());
 }
 
-// By its height above the median of the spectrum; and, where a record is too short for that, by
-// how much the fit gains of what is left (the likelihood ratio), against the largest of so many
-// frequencies that noise alone has once in ten thousand records or less.
+// By its height above the median of the spectrum; and, where the record is too short for that or
+// the spectrum does not resolve the line, by how much the fit gains of what is left (the likelihood
+// ratio), against the largest that noise alone makes of so many frequencies.
 bool ToneSearch::isAboveNoise(const Peak &peak, double squaresBefore) const {
     constexpr double margin = 9.0;
     const double threshold = std::log(static_cast<double>(n_)) + margin;

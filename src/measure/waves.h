@@ -19,8 +19,7 @@ struct BlockWave {
 
 // waves = the wave of a block, from the table of a phasor that is 1 at its first sample: waveBlock
 // cosines, waveBlock sines, in both. Subtracts cosine and sine times the wave from `left`.
-QX_BY_WIDTH(void, SubtractWave,
-            (const BlockWave &wave, const DBL *table, DBL *waves, DBL *left))
+QX_BY_WIDTH(void, SubtractWave, (const BlockWave &wave, const DBL *table, DBL *waves, DBL *left))
 
 // sums[0 to 3] = left times cosines, left times sines, and both times the place in the block. Each
 // is four sums, of every fourth term, which are added at the end.

@@ -149,8 +149,8 @@ They are not in the ratios.
 {noisy}
 
 The fit is the estimate of maximum likelihood and reaches the bound where the tones stand out of the
-noise. Less than a bin apart the bound itself is large: where it exceeds the distance of the tones the
-errors do not follow it.
+noise, half a bin apart, too. Ratios below 1 are within what so many records scatter, or of bounds so
+wide that the neighbour limits the error.
 
 **False tones.** Of {records} records of a tone in white noise {false} have a second tone.
 """

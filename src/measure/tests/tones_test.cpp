@@ -36,8 +36,8 @@ Samples Sampled(const Tones &tones, int32_t n, double dt = 1, double offset = 0)
         for (const Tone &tone : tones) {
             long double turns = static_cast<long double>(tone.frequency) * dt * t;
             turns -= std::floor(turns);
-            sum += tone.amplitude *
-                   std::cos(2 * std::numbers::pi_v<long double> * turns + tone.phase);
+            sum +=
+                tone.amplitude * std::cos(2 * std::numbers::pi_v<long double> * turns + tone.phase);
         }
         y[t] = static_cast<double>(sum);
     }
@@ -61,9 +61,9 @@ double Error(const Tones &found, const Tones &expected) {
     double error = 0;
     for (std::size_t i = 0; i < found.size(); ++i) {
         const double turn = std::remainder(found[i].phase - expected[i].phase, 2 * pi);
-        error = std::max({error, std::fabs(found[i].frequency / expected[i].frequency - 1),
-                          std::fabs(found[i].amplitude / expected[i].amplitude - 1),
-                          std::fabs(turn)});
+        error =
+            std::max({error, std::fabs(found[i].frequency / expected[i].frequency - 1),
+                      std::fabs(found[i].amplitude / expected[i].amplitude - 1), std::fabs(turn)});
     }
     return error;
 }

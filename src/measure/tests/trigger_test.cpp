@@ -42,8 +42,9 @@ Hits InBlocks(const Samples &y, const Settings &settings, const std::vector<int3
     TriggerState state = {};
     std::size_t block = 0;
     for (std::size_t begin = 0; begin < y.size(); ++block) {
-        const auto length = std::min(y.size() - begin, static_cast<std::size_t>(
-                                                           lengths[std::min(block, lengths.size() - 1)]));
+        const auto length =
+            std::min(y.size() - begin,
+                     static_cast<std::size_t>(lengths[std::min(block, lengths.size() - 1)]));
         const DBLArray samples(Samples(y.begin() + static_cast<std::ptrdiff_t>(begin),
                                        y.begin() + static_cast<std::ptrdiff_t>(begin + length)));
         int32_t index = -1;
@@ -54,8 +55,8 @@ Hits InBlocks(const Samples &y, const Settings &settings, const std::vector<int3
                                   &position),
                       0);
             if (index >= 0)
-                hits.push_back({static_cast<int64_t>(begin) + index,
-                                position + static_cast<double>(begin)});
+                hits.push_back(
+                    {static_cast<int64_t>(begin) + index, position + static_cast<double>(begin)});
         } while (index >= 0);
         EXPECT_TRUE(std::isnan(position));
         begin += length;
@@ -137,8 +138,7 @@ TEST(Trigger, PlacesBetweenTheSamplesAroundTheLevel) {
     EXPECT_EQ(InBlocks({-1e308, 1e308}, {0.0, 0.0, 0, 0}, {2}), (Hits{{1, 0.5}}));
     // Armed, then past the level within a holdoff: it triggers behind that, at the sample itself.
     EXPECT_EQ(InBlocks({0, 2, 0, 2, 3, 3}, {1.0, 0.0, 2, 2}, {6}), (Hits{{1, 0.5}}));
-    EXPECT_EQ(InBlocks({0, 2, 0, 0, 0, 3}, {1.0, 0.0, 2, 2}, {6}),
-              (Hits{{1, 0.5}, {4, 4}}));
+    EXPECT_EQ(InBlocks({0, 2, 0, 0, 0, 3}, {1.0, 0.0, 2, 2}, {6}), (Hits{{1, 0.5}, {4, 4}}));
     // A sample at the level triggers and does not arm, and a jitter within the band counts once.
     EXPECT_EQ(InBlocks({0, 1, 0.9, 1.1, 0.9, 1.1, 0, 1}, {1.0, 0.25, 0, 0}, {8}),
               (Hits{{1, 1}, {7, 7}}));
