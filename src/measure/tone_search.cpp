@@ -117,8 +117,8 @@ ErrorCode ToneSearch::largestLine(const Band &band, Peak &peak) {
     for (int32_t k = 1; k < half; ++k)
         power[k] = spectrum[k] * spectrum[k] + spectrum[m - k] * spectrum[m - k];
     peak = {0, 0, 0};
-    const auto from = static_cast<int32_t>(std::max(1.0, std::ceil(band.low * m)));
-    const auto to = static_cast<int32_t>(std::min(half - 1.0, std::floor(band.high * m)));
+    const auto from = static_cast<int32_t>(std::clamp(std::ceil(band.low * m), 1.0, half + 0.0));
+    const auto to = static_cast<int32_t>(std::clamp(std::floor(band.high * m), 0.0, half - 1.0));
     int32_t highest = -1;
     for (int32_t k = from; k <= to; ++k)
         if (power[k] > 0 && (highest < 0 || power[k] > power[highest]))
@@ -145,6 +145,8 @@ void ToneSearch::fitFrom(double frequency, int32_t split, double offset, State &
     std::copy(former(), former() + count_, lines());
     lines()[count_] = {frequency, 0, 0, 1, count_};
     if (split >= 0) {
+        if (frequency <= std::fabs(offset) || frequency >= 0.5 - std::fabs(offset))
+            return;
         lines()[count_].frequency = frequency + offset;
         lines()[split].frequency = frequency - offset;
     }

@@ -128,6 +128,8 @@ Outcome Harmonics(In<DBL1D> y, double dt, double fundamental, int32_t highest, d
     Band band = wholeBand;
     if (fundamental > 0) {
         const double seen = Seen(fundamental, dt);
+        if (!std::isfinite(seen))
+            return ErrMeasureNotFound;
         const double reach = std::max(2.0 / n, 0.01 * seen);
         band = {seen - reach, seen + reach};
     }

@@ -225,7 +225,10 @@ TEST(SingleTone, IsTheLargestOfItsBand) {
     EXPECT_NEAR(weaker.residualRms, std::sqrt((100 + 1) / 2.0), 0.02);
     EXPECT_LT(Error({MeasureOne(y, 120, 5, 1e-3).tone}, {tones[1]}), 1e-2);
     EXPECT_EQ(MeasureOne(y, 200, 30, 1e-3).code, ErrMeasureNotFound);
-    EXPECT_EQ(MeasureOne(y, 2000, 30, 1e-3).code, ErrMeasureNotFound);
+    for (const double centre : {2000.0, -2000.0, 1e300, -1e300})
+        EXPECT_EQ(MeasureOne(y, centre, 30, 1e-3).code, ErrMeasureNotFound);
+    EXPECT_LT(Error({MeasureOne(y, 1e308, 1.7e308, 1e-3).tone}, {tones[0]}), 1e-3);
+    EXPECT_EQ(Analyse(y, 3, 1e308, 0, 1e3).code, ErrMeasureNotFound);
 
     // Behind more larger tones than are fitted along.
     Tones many;
