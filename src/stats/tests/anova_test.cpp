@@ -5,7 +5,9 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cmath>
+#include <cstdlib>
 #include <fstream>
 #include <limits>
 #include <sstream>
@@ -135,6 +137,316 @@ TEST(Anova, CodesComeInTheirOrder) {
     EXPECT_EQ(code({1, 2, 3, 2}, 2, 0.5), ErrAnovaFactorEmpty);
     EXPECT_EQ(code({1, 1, 1, 1}, 2, 0.5), ErrAnovaNoReplication);
     EXPECT_EQ(code({1, 2, 1, 2}, 2, 0.5), 0);
+}
+
+struct Observation {
+    int32_t level[3];
+    double y;
+};
+
+struct Crossed {
+    int factors = 2;
+    int32_t levels[3] = {}; // negative: random
+    int32_t observations = 1;
+    std::vector<Observation> data;
+
+    std::vector<double> values() const {
+        std::vector<double> y;
+        for (const Observation &observation : data)
+            y.push_back(observation.y);
+        return y;
+    }
+    std::vector<int32_t> labels(int factor) const {
+        std::vector<int32_t> labels;
+        for (const Observation &observation : data)
+            labels.push_back(observation.level[factor]);
+        return labels;
+    }
+};
+
+enum Column { SumOfSquares, Degrees, MeanSquare, F, P, DenominatorDegrees, Critical, Columns };
+
+struct Table {
+    ErrorCode err = 0;
+    std::vector<double> column[Columns];
+    double f(std::size_t source) const { return column[F].at(source); }
+};
+
+// By both revisions, which agree to the bit.
+Table TableOf(const Crossed &design, double significance = 0.05) {
+    const DBLArray y(design.values());
+    const I32Array a(design.labels(0)), b(design.labels(1)), c(design.labels(2));
+    const DBLArray old[] = {DBLArray{7}, DBLArray{7}, DBLArray{7},
+                            DBLArray{7}, DBLArray{7}, DBLArray{7}};
+    const DBLArray now[] = {DBLArray{7}, DBLArray{7}, DBLArray{7}, DBLArray{7},
+                            DBLArray{7}, DBLArray{7}, DBLArray{7}};
+    const int32_t *k = design.levels;
+    const auto out = [&](int i) { return now[i].handle(); };
+    const auto outOfOld = [&](int i) { return old[i].handle(); };
+    Table table;
+    ErrorCode oldErr;
+    if (design.factors == 2) {
+        oldErr = Anova2Way_head(y.handle(), a.handle(), b.handle(), k[0], k[1], design.observations,
+                                outOfOld(0), outOfOld(1), outOfOld(2), outOfOld(3), outOfOld(4),
+                                outOfOld(5));
+        table.err = Anova2Way_head_2017(y.handle(), a.handle(), b.handle(), k[0], k[1],
+                                        design.observations, significance, out(0), out(1), out(2),
+                                        out(3), out(4), out(5), out(6));
+    } else {
+        oldErr = ANOVA3Way_head(y.handle(), a.handle(), b.handle(), c.handle(), k[0], k[1], k[2],
+                                design.observations, outOfOld(0), outOfOld(1), outOfOld(2),
+                                outOfOld(3), outOfOld(4), outOfOld(5));
+        table.err = ANOVA3Way_head_2017(y.handle(), a.handle(), b.handle(), c.handle(), k[0], k[1],
+                                        k[2], design.observations, significance, out(0), out(1),
+                                        out(2), out(3), out(4), out(5), out(6));
+    }
+    if (table.err != ErrBadSignificance) {
+        EXPECT_EQ(oldErr, table.err);
+    }
+    for (int i = 0; i < Columns; ++i) {
+        table.column[i] = now[i].values();
+        EXPECT_EQ(table.column[i].empty(), table.err != 0);
+        for (int32_t at = 0; i < Critical && table.err == 0 && at < now[i].size(); ++at)
+            EXPECT_EQ(std::isnan(old[i][at]) ? 0.0 : old[i][at],
+                      std::isnan(now[i][at]) ? 0.0 : now[i][at]);
+    }
+    return table;
+}
+
+// A full factorial with the value of each observation.
+template <class Value>
+Crossed FullFactorial(std::vector<int32_t> levels, int32_t observations, Value value) {
+    Crossed design;
+    design.factors = static_cast<int>(levels.size());
+    levels.resize(3, 1);
+    design.observations = observations;
+    for (int i = 0; i < 3; ++i)
+        design.levels[i] = levels[static_cast<std::size_t>(i)];
+    for (int32_t k = 0; k < observations; ++k)
+        for (int32_t a = 0; a < std::abs(levels[0]); ++a)
+            for (int32_t b = 0; b < std::abs(levels[1]); ++b)
+                for (int32_t c = 0; c < std::abs(levels[2]); ++c)
+                    design.data.push_back({{a, b, c}, value(a, b, c, k)});
+    return design;
+}
+
+// The observations in another order and with other labels.
+Crossed Disguised(Crossed design) {
+    for (std::size_t i = design.data.size() - 1; i > 0; --i)
+        std::swap(design.data[i], design.data[i * 7919 % (i + 1)]);
+    for (Observation &observation : design.data)
+        for (int32_t &level : observation.level)
+            level = static_cast<int32_t>(0x9e3779b9u * static_cast<uint32_t>(level + 5));
+    return design;
+}
+
+double ReadNumber(std::istream &words) {
+    std::string word;
+    words >> word;
+    return std::strtod(word.c_str(), nullptr); // streams do not read hexadecimal fractions
+}
+
+// Exact tables (make_factorial_anova_data.py): published data, all choices of random factors, one
+// observation per cell, and data in eighths that lie 10^9 away from 0.
+TEST(FactorialAnova, AgreesWithExactTables) {
+    const double bounds[] = {2.3e-16, 0.0, 2.3e-16, 2.3e-16, 7e-15, 1.4e-15, 4e-15};
+    double worst[Columns] = {};
+    std::ifstream file(qx::test::TestData("factorial_anova.dat"));
+    int designs = 0;
+    for (std::string line, word; std::getline(file, line); ++designs) {
+        std::istringstream words(line);
+        std::string name, expected;
+        Crossed design;
+        words >> word >> name >> design.factors;
+        int32_t cells = 1;
+        for (int i = 0; i < design.factors; ++i) {
+            words >> design.levels[i];
+            cells *= std::abs(design.levels[i]);
+        }
+        words >> design.observations;
+        const double significance = ReadNumber(words);
+        SCOPED_TRACE(name);
+        for (int i = 0; i < cells * design.observations; ++i) {
+            Observation observation = {};
+            for (int j = 0; j < design.factors; ++j)
+                file >> observation.level[j];
+            observation.y = ReadNumber(file);
+            design.data.push_back(observation);
+        }
+        const Table table = TableOf(Disguised(design), significance);
+        ASSERT_EQ(table.err, 0);
+        const std::size_t sources = design.factors == 2 ? 5 : 9;
+        for (std::size_t source = 0; source < sources; ++source) {
+            file >> word;
+            for (int i = 0; i < Columns; ++i) {
+                const double exact = ReadNumber(file);
+                const double value = table.column[i].at(source);
+                if (std::isnan(exact) || exact == 0.0) {
+                    EXPECT_TRUE(std::isnan(exact) ? std::isnan(value) : value == exact) << word;
+                    continue;
+                }
+                const double error = std::fabs(value / exact - 1.0);
+                EXPECT_LE(error, bounds[i]) << word << ", column " << i;
+                worst[i] = std::max(worst[i], error);
+            }
+        }
+        EXPECT_EQ(table.column[F].size(), sources);
+        std::getline(file, line);
+    }
+    EXPECT_EQ(designs, 27);
+    for (int i = 0; i < Columns; ++i)
+        RecordProperty("worst" + std::to_string(i), testing::PrintToString(worst[i]));
+}
+
+// f belongs to the data up to a constant and a factor, beyond the range of their squares, too.
+TEST(FactorialAnova, KeepsItsRatiosAtEveryScale) {
+    const auto value = [](int32_t a, int32_t b, int32_t c, int32_t k) {
+        return a * 3 - b * 2 + a * b * 0.5 + c * (a - 1) * 0.25 +
+               (a * 5 + b * 3 + c + k * 7) % 11 / 8.0;
+    };
+    const Crossed design = FullFactorial({-3, 4, 2}, 3, value);
+    const Table table = TableOf(design);
+    ASSERT_EQ(table.err, 0);
+    for (const double scale : {0x1p-1070, 0x1p-600, -0x1p600, 0x1p1018}) {
+        SCOPED_TRACE(scale);
+        Crossed scaled = design;
+        for (Observation &observation : scaled.data)
+            observation.y *= scale;
+        const Table other = TableOf(scaled);
+        ASSERT_EQ(other.err, 0);
+        if (scale == 0x1p-1070) // with rounded data
+            continue;
+        for (std::size_t source = 0; source < 7; ++source) {
+            EXPECT_EQ(other.f(source), table.f(source));
+            EXPECT_EQ(other.column[P][source], table.column[P][source]);
+        }
+    }
+    // The largest differences overflow.
+    const Crossed huge = FullFactorial({2, 2}, 2, [](int32_t a, int32_t b, int32_t, int32_t k) {
+        return (a == 0 ? -1.0 : 1.0) * (b + 3 * k + 4) * 0x1p1020;
+    });
+    const Crossed same = FullFactorial({2, 2}, 2, [](int32_t a, int32_t b, int32_t, int32_t k) {
+        return (a == 0 ? -1.0 : 1.0) * (b + 3 * k + 4);
+    });
+    EXPECT_EQ(TableOf(huge).column[F].at(0), TableOf(same).column[F].at(0));
+    EXPECT_EQ(TableOf(huge).column[SumOfSquares].at(0), std::numeric_limits<double>::infinity());
+}
+
+TEST(FactorialAnova, EndsOfTheRangeOfSignificance) {
+    const Crossed design = FullFactorial({3, 2}, 2, [](int32_t a, int32_t b, int32_t, int32_t k) {
+        return a * a + b + k * (1.0 + a * b);
+    });
+    EXPECT_EQ(TableOf(design, 0.0).column[Critical].at(0), std::numeric_limits<double>::infinity());
+    EXPECT_EQ(TableOf(design, 1.0).column[Critical].at(0), 0.0);
+    for (const double none : {-0x1p-1074, 1.0 + 0x1p-52, std::nan("")})
+        EXPECT_EQ(TableOf(design, none).err, ErrBadSignificance);
+}
+
+// What is 0 in truth is no rounding error, whatever the fractions.
+TEST(FactorialAnova, RefusesDenominatorsThatVanish) {
+    const auto equalInCells = [](int32_t a, int32_t b, int32_t c, int32_t) {
+        return 0.1 * a + 0.7 * b * a - 1.3 * c;
+    };
+    EXPECT_EQ(TableOf(FullFactorial({3, 7}, 3, equalInCells)).err, ErrAnovaDesign);
+    EXPECT_EQ(TableOf(FullFactorial({3, 7, 2}, 5, equalInCells)).err, ErrAnovaDesign);
+    const auto additive = [](int32_t a, int32_t b, int32_t, int32_t) {
+        return 1e6 * (a * a % 7) + 3.0 * (b * b % 11) + 1.0;
+    };
+    EXPECT_EQ(TableOf(FullFactorial({7, 11}, 1, additive)).err, ErrAnovaDesign);
+    const auto constant = [](int32_t, int32_t, int32_t, int32_t) { return 0.1; };
+    EXPECT_EQ(TableOf(FullFactorial({3, 3}, 2, constant)).err, ErrAnovaDesign);
+
+    // Replicates that differ alike in all cells: the error is there, the interaction is not.
+    const auto noInteraction = [&](int32_t a, int32_t b, int32_t c, int32_t k) {
+        return additive(a, b, c, k) + k;
+    };
+    EXPECT_EQ(TableOf(FullFactorial({7, 11}, 2, noInteraction)).f(2), 0.0);
+    EXPECT_EQ(TableOf(FullFactorial({7, 11}, 2, noInteraction)).column[P].at(2), 1.0);
+    EXPECT_EQ(TableOf(FullFactorial({-7, 11}, 2, noInteraction)).err, ErrAnovaDesign);
+
+    // MS(AB) + MS(AC) below MS(ABC), a denominator only where B and C are random.
+    const auto parity = [](int32_t a, int32_t b, int32_t c, int32_t k) {
+        return ((a + b + c) % 2) * 8.0 + k + a;
+    };
+    EXPECT_EQ(TableOf(FullFactorial({2, -2, -2}, 2, parity)).err, ErrAnovaDesign);
+    EXPECT_EQ(TableOf(FullFactorial({2, 2, 2}, 2, parity)).err, 0);
+    // Equal to the bit of all fractions: thirds.
+    const auto balanced = [](int32_t a, int32_t b, int32_t c, int32_t k) {
+        const int32_t signs[] = {1, -2, 1};
+        const double u = signs[a], v = signs[b], w = signs[c];
+        return u * v * w + 0.5 * u * v + 0.5 * u * w + k + 1 / 3.0;
+    };
+    const Table fixed = TableOf(FullFactorial({3, 3, 3}, 2, balanced));
+    ASSERT_EQ(fixed.err, 0);
+    EXPECT_EQ(TableOf(FullFactorial({-3, -3, -3}, 2, balanced)).err, ErrAnovaDesign);
+}
+
+TEST(FactorialAnova, CodesComeInTheirOrder) {
+    const auto value = [](int32_t a, int32_t b, int32_t c, int32_t k) {
+        return a * 3 + b * 5 % 7 + c + k * (a + 2.0 * b + 1);
+    };
+    for (const int factors : {2, 3}) {
+        SCOPED_TRACE(factors);
+        const std::vector<int32_t> levels = {3, 2, 2};
+        Crossed design = FullFactorial({levels.begin(), levels.begin() + factors}, 2, value);
+        EXPECT_EQ(TableOf(design).err, 0);
+        const int last = factors - 1;
+        // From here on each fault comes before all those that are already there.
+        EXPECT_EQ(TableOf(design, 2.0).err, ErrBadSignificance);
+        for (const double bad : {std::nan(""), std::numeric_limits<double>::infinity()}) {
+            design.data.back().y = bad;
+            EXPECT_EQ(TableOf(design, 2.0).err, ErrNaNInData);
+        }
+        design.data[0].level[0] = 1;
+        EXPECT_EQ(TableOf(design, 2.0).err, ErrAnovaCellCount);
+        design.data[1].level[last] = 77;
+        EXPECT_EQ(TableOf(design, 2.0).err, ErrAnovaFactorEmpty) << "one label too many";
+        for (Observation &observation : design.data)
+            observation.level[last] = 5;
+        EXPECT_EQ(TableOf(design, 2.0).err, ErrAnovaFactorEmpty) << "one too few";
+        design.data.pop_back();
+        EXPECT_EQ(TableOf(design, 2.0).err, ErrAnovaCountMismatch);
+        design.levels[last] = std::numeric_limits<int32_t>::min();
+        EXPECT_EQ(TableOf(design, 2.0).err, ErrAnovaCountMismatch);
+        design.observations = 1;
+        EXPECT_EQ(TableOf(design, 2.0).err, ErrAnovaNegativeSelector);
+        design.observations = 0;
+        EXPECT_EQ(TableOf(design, 2.0).err, ErrAnovaNoReplication);
+        design.levels[0] = -1;
+        EXPECT_EQ(TableOf(design, 2.0).err, ErrAnovaFewLevels);
+        design.data.clear();
+        EXPECT_EQ(TableOf(design, 2.0).err, ErrEmptyInput);
+    }
+    const DBLArray y({1, 2, 3, 4});
+    const I32Array a({1, 2, 1, 2}), b({1, 2, 1});
+    const DBLArray out[6] = {DBLArray{7}, DBLArray{7}, DBLArray{7},
+                             DBLArray{7}, DBLArray{7}, DBLArray{7}};
+    EXPECT_EQ(Anova2Way_head(y.handle(), a.handle(), b.handle(), 1, 2, 1, out[0].handle(),
+                             out[1].handle(), out[2].handle(), out[3].handle(), out[4].handle(),
+                             out[5].handle()),
+              ErrSizeMismatch);
+}
+
+// A denominator that nearly vanishes has next to no degrees of freedom, and no critical value that
+// a double holds.
+TEST(FactorialAnova, NearlyNoDegreesOfFreedom) {
+    double f = 0.0;
+    for (double part = 0.5; part < 0.5625; part += 0x1p-10) {
+        const auto value = [=](int32_t a, int32_t b, int32_t c, int32_t k) {
+            const double u = a * 2 - 1, v = b * 2 - 1, w = c * 2 - 1;
+            return u * v * w + part * u * v + 0.875 * u * w + 2 * v * w + k * 0.25 + u;
+        };
+        const Table table = TableOf(FullFactorial({2, -2, -2}, 2, value), 0.05);
+        if (table.err == ErrAnovaDesign)
+            continue;
+        const double degrees = table.column[DenominatorDegrees].at(0);
+        const double p = table.column[P].at(0);
+        EXPECT_TRUE(degrees > 0.0 && degrees < 0.1);
+        EXPECT_TRUE(p > 0.5 && p <= 1.0) << p << " with " << degrees;
+        EXPECT_GT(table.column[Critical].at(0), 1e10);
+        f = table.f(0);
+    }
+    EXPECT_GT(f, 0.0);
 }
 
 struct Contingency {
