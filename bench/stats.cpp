@@ -1,10 +1,12 @@
-// Sorting, selection and the strictly sequential sums.
+// Sorting, selection, the strictly sequential sums, and analysis of variance.
 //
-// bench_stats [GROUP...]: sort, median, sums; all by default. Peers: std::sort and
-// std::nth_element on a copy, and for the sums the latency limit of their order of summation.
+// bench_stats [GROUP...]: sort, median, sums, anova; all by default. Peers: std::sort and
+// std::nth_element on a copy, for the sums the latency limit of their order of summation, and for
+// the analysis of variance the same sums in doubles where the cells are known.
 
 #include "bench/timing.h"
 #include "stats/basic.h"
+#include "stats/factorial_anova.h"
 #include "stats/order.h"
 
 #include <cstdint>
@@ -169,6 +171,63 @@ void Sums() {
     ratios.summary("latency of as many additions");
 }
 
+// Sums of squares of error and total by deviations from the means of known cells: two passes in
+// doubles, no labels, no checks.
+double PlainSquares(const double *y, const int32_t *cellOf, int32_t n, std::vector<double> &means) {
+    std::fill(means.begin(), means.end(), 0.0);
+    double mean = 0.0;
+    for (int32_t k = 0; k < n; ++k) {
+        means[static_cast<std::size_t>(cellOf[k])] += y[k];
+        mean += y[k];
+    }
+    const double observations = n / static_cast<double>(means.size());
+    for (double &cell : means)
+        cell /= observations;
+    mean /= n;
+    double error = 0.0;
+    double total = 0.0;
+    for (int32_t k = 0; k < n; ++k) {
+        const double within = y[k] - means[static_cast<std::size_t>(cellOf[k])];
+        error += within * within;
+        total += (y[k] - mean) * (y[k] - mean);
+    }
+    return error / total;
+}
+
+void Anova() {
+    Ratios ratios("analysis of variance, three factors");
+    constexpr int32_t levels[] = {4, 5, 3};
+    constexpr int32_t cells = 60;
+    for (const int32_t n : {240, 6000, 60000, 1200000}) {
+        const Pool y(n, Random);
+        std::vector<int32_t> cellOf(static_cast<std::size_t>(n));
+        std::vector<int32_t> labels[3];
+        for (int32_t k = 0; k < n; ++k) {
+            cellOf[static_cast<std::size_t>(k)] = k % cells;
+            int32_t rest = k % cells;
+            for (int i = 0; i < 3; ++i, rest /= levels[i - 1])
+                labels[i].push_back(rest % levels[i]);
+        }
+        std::vector<double> means(cells);
+        int turn = 0;
+        int otherTurn = 0;
+        qx::FactorialTable table;
+        const auto [ours, peer] = LeastTimes(
+            [&] {
+                qx::FactorialDesign design = {y.next(turn), n, n / cells, 3, {}};
+                for (int i = 0; i < 3; ++i)
+                    design.factor[i] = {labels[i].data(), levels[i], false};
+                qx::FactorialAnova(design, nullptr, &table);
+                Keep(table.source[0].f);
+            },
+            [&] { Keep(PlainSquares(y.next(otherTurn), cellOf.data(), n, means)); });
+        std::printf("anova n %9d %8.2f ns an observation  ratio %5.2f\n", n, ours / n * 1e9,
+                    ours / peer);
+        ratios.add(ours / peer, std::to_string(n));
+    }
+    ratios.summary("two plain passes over known cells");
+}
+
 } // namespace
 
 int main(int argc, char **argv) {
@@ -183,5 +242,7 @@ int main(int argc, char **argv) {
         Sort();
     if (wanted("median"))
         Median();
+    if (wanted("anova"))
+        Anova();
     return 0;
 }
