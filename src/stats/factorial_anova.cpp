@@ -141,8 +141,9 @@ public:
         double least = y_[0];
         double largest = y_[0];
         for (int32_t k = 1; k < design.n; ++k) {
-            least = std::min<double>(least, y_[k]);
-            largest = std::max<double>(largest, y_[k]);
+            const double value = y_[k]; // whose address is aligned, unlike an element's
+            least = std::min(least, value);
+            largest = std::max(largest, value);
         }
         constexpr int limit = 1000;
         int exponent = limit;
