@@ -52,15 +52,16 @@ QX_API int32_t Anova1Way_head_2017(QX_IN DBL1D y, QX_IN I32_1D labels, QX_IN con
     that it is random, with that many levels.
 
     The outputs have an element for each source, in the order A, B, AB, error, total: sum of
-   squares, degrees of freedom, mean square, the ratio f of the mean square to that of its
-   denominator, the probability p of a larger ratio, and the denominator's degrees of freedom. A
-   source without such a number has NaN there: the error and the total have no f, and the total no
-   mean square. With one observation per cell the interaction is the error, and its own source has
-   NaN, with 0 degrees of freedom.
+    squares, degrees of freedom, mean square, the ratio f of the mean square to that of its
+    denominator, the probability p of a larger ratio, and the denominator's degrees of freedom. A
+    source without such a number has NaN there: the error and the total have no f, and the total no
+    mean square. With one observation per cell the interaction is the error, and its own source has
+    NaN, with 0 degrees of freedom.
 
     The denominator has the expected mean square of the source with the source's own part taken off,
-   by the unrestricted model, in which interactions with a random factor are random and independent:
-   where no factor is random the error for all; else AB for A and B, and the error for AB.
+    by the unrestricted model, in which interactions with a random factor are random and
+    independent: where no factor is random the error for all; else AB for A and B, and the error for
+    AB.
 
     Differences to one observation are taken first and all deviations from means are formed in twice
     the precision, so f has the digits of the data whatever their mean and scale; a sum of squares
@@ -69,12 +70,12 @@ QX_API int32_t Anova1Way_head_2017(QX_IN DBL1D y, QX_IN I32_1D labels, QX_IN con
     restricted model are not served.
     Codes: ErrEmptyInput (y is empty), ErrSizeMismatch (y and the labels differ in length),
     ErrAnovaFewLevels (a factor has fewer than 2 levels), ErrAnovaNoReplication (observations is
-   below 1), ErrAnovaNegativeSelector (one observation per cell and a random factor),
-   ErrAnovaCountMismatch (the length of y is not the product of levels and observations),
-   ErrAnovaFactorEmpty (a factor has more or fewer different labels than levels), ErrAnovaCellCount
-   (a cell has another number of observations), ErrNaNInData (y contains NaN or an infinity),
-   ErrAnovaDesign (a denominator is not above 0), ErrOutOfMemory (no scratch memory, or an array
-   cannot be resized). */
+    below 1), ErrAnovaNegativeSelector (one observation per cell and a random factor),
+    ErrAnovaCountMismatch (the length of y is not the product of levels and observations),
+    ErrAnovaFactorEmpty (a factor has more or fewer different labels than levels), ErrAnovaCellCount
+    (a cell has another number of observations), ErrNaNInData (y contains NaN or an infinity),
+    ErrAnovaDesign (a denominator is not above 0), ErrOutOfMemory (no scratch memory, or an array
+    cannot be resized). */
 QX_API ErrorCode Anova2Way_head(QX_IN DBL1D y, QX_IN I32_1D labelsA, QX_IN I32_1D labelsB,
                                 int32_t levelsA, int32_t levelsB, int32_t observations,
                                 QX_OUT DBL1D sumsOfSquares, QX_OUT DBL1D degrees,
@@ -85,12 +86,12 @@ QX_API ErrorCode Anova2Way_head(QX_IN DBL1D y, QX_IN I32_1D labelsA, QX_IN I32_1
     relative: infinite for a significance of 0 or where none is below 1e290, 0 for one of 1.
     Codes: ErrEmptyInput (y is empty), ErrSizeMismatch (y and the labels differ in length),
     ErrAnovaFewLevels (a factor has fewer than 2 levels), ErrAnovaNoReplication (observations is
-   below 1), ErrAnovaNegativeSelector (one observation per cell and a random factor),
-   ErrAnovaCountMismatch (the length of y is not the product of levels and observations),
-   ErrAnovaFactorEmpty (a factor has more or fewer different labels than levels), ErrAnovaCellCount
-   (a cell has another number of observations), ErrNaNInData (y contains NaN or an infinity),
-   ErrBadSignificance (significance lies outside [0, 1] or is NaN), ErrAnovaDesign (a denominator is
-   not above 0), ErrOutOfMemory (no scratch memory, or an array cannot be resized). */
+    below 1), ErrAnovaNegativeSelector (one observation per cell and a random factor),
+    ErrAnovaCountMismatch (the length of y is not the product of levels and observations),
+    ErrAnovaFactorEmpty (a factor has more or fewer different labels than levels), ErrAnovaCellCount
+    (a cell has another number of observations), ErrNaNInData (y contains NaN or an infinity),
+    ErrBadSignificance (significance lies outside [0, 1] or is NaN), ErrAnovaDesign (a denominator
+    is not above 0), ErrOutOfMemory (no scratch memory, or an array cannot be resized). */
 QX_API ErrorCode Anova2Way_head_2017(QX_IN DBL1D y, QX_IN I32_1D labelsA, QX_IN I32_1D labelsB,
                                      int32_t levelsA, int32_t levelsB, int32_t observations,
                                      double significance, QX_OUT DBL1D sumsOfSquares,
@@ -101,13 +102,14 @@ QX_API ErrorCode Anova2Way_head_2017(QX_IN DBL1D y, QX_IN I32_1D labelsA, QX_IN 
 /** As Anova2Way_head, with three factors. The sources are A, B, C, AB, AC, BC, ABC, error, total.
 
     Where no factor is random the error is the denominator for all. Else it is the error for ABC,
-   ABC for the interactions of two factors, and for a factor its interaction with the other factor
-   if one alone of these interactions is random (it contains a random factor). If both are, as for A
-   with AB and AC, no single mean square serves, and the denominator is MS(AB) + MS(AC) - MS(ABC),
-   with the degrees of freedom of F. E. Satterthwaite (An approximate distribution of estimates of
-   variance components, 1946): its square over MS(AB)^2 / df(AB) + MS(AC)^2 / df(AC) + MS(ABC)^2 /
-   df(ABC), which need not be whole; it is small, and f little worth, where the difference nearly
-   vanishes, and ErrAnovaDesign where it is not above 0. */
+    ABC for the interactions of two factors, and for a factor its interaction with the other factor
+    if only one of these two interactions contains a random factor. If both do, as AB and AC may for
+    A, no single mean square has the expectation that is needed, and the denominator is MS(AB) +
+    MS(AC) - MS(ABC), with the degrees of freedom of F. E. Satterthwaite (An approximate
+    distribution of estimates of variance components, 1946): its square over MS(AB)^2 / df(AB) +
+    MS(AC)^2 / df(AC) + MS(ABC)^2 / df(ABC), which need not be whole. They are few, and f means
+    little, where the difference nearly vanishes; where it is not above 0 the whole table is refused
+    with ErrAnovaDesign. */
 QX_API ErrorCode ANOVA3Way_head(QX_IN DBL1D y, QX_IN I32_1D labelsA, QX_IN I32_1D labelsB,
                                 QX_IN I32_1D labelsC, int32_t levelsA, int32_t levelsB,
                                 int32_t levelsC, int32_t observations, QX_OUT DBL1D sumsOfSquares,
