@@ -350,7 +350,7 @@ TEST(FactorialAnova, RefusesDenominatorsThatVanish) {
     EXPECT_EQ(TableOf(FullFactorial({3, 7}, 3, equalInCells)).err, ErrAnovaDesign);
     EXPECT_EQ(TableOf(FullFactorial({3, 7, 2}, 5, equalInCells)).err, ErrAnovaDesign);
     const auto additive = [](int32_t a, int32_t b, int32_t, int32_t) {
-        return 1e6 * (a * a % 7) + 3.0 * (b * b % 11) + 1.0;
+        return 12345.625 * (a * 37 % 101) + 0.375 * (b * 53 % 97) + 1.0;
     };
     EXPECT_EQ(TableOf(FullFactorial({7, 11}, 1, additive)).err, ErrAnovaDesign);
     const auto constant = [](int32_t, int32_t, int32_t, int32_t) { return 0.1; };
