@@ -43,11 +43,14 @@ def gives_value(entry):
 
 
 def is_of_scalars(entry):
-    """A function of real numbers, which maps over arrays."""
+    """A function of numbers, which maps over arrays."""
     arguments = entry["arguments"]
     return any(map(is_given, arguments)) and entry["returns"] in (*RESULTS, "void") and all(
-        a["kind"] in ("value", "reference", "output", "error") and a["element"] not in COMPLEX
-        for a in arguments)
+        a["kind"] in ("value", "reference", "output", "error") for a in arguments)
+
+
+def plain_type(element):
+    return "_complex" if element in COMPLEX else "_int" if element in LIMITS else "_float"
 
 
 def annotation(argument):
@@ -235,8 +238,7 @@ class Writer:
     def _mapping(self):
         """The way of a function of numbers that is given arrays."""
         given = [a for a in self.entry["arguments"] if is_given(a)]
-        plain = " and ".join(f"_type({python_name(a)}) is {'_int' if a['element'] in LIMITS else '_float'}"
-                             for a in given)
+        plain = " and ".join(f"_type({python_name(a)}) is {plain_type(a['element'])}" for a in given)
         values = ", ".join(map(python_name, given)) + ","
         self.names["_entry"] = self.entry
         return [f"if not ({plain}) and _many({values}):",

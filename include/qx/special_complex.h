@@ -1,0 +1,88 @@
+#ifndef QX_SPECIAL_COMPLEX_H
+#define QX_SPECIAL_COMPLEX_H
+
+/* Bessel functions of real order and complex argument, and Airy functions of complex argument. The
+   order is any real number. Where a function has a cut, it is the negative real axis, and the sign
+   of a zero imaginary part chooses the side. On the positive real axis J, Y, I, K and the Airy
+   functions have the imaginary part 0, and on the negative one so do the unscaled Airy functions.
+   What underflows is 0. The numbers of formulas are those of M. Abramowitz and I. A. Stegun,
+   Handbook of mathematical functions, 1964; the methods, region by region, follow D. E. Amos,
+   Algorithm 644, ACM Transactions on Mathematical Software 12, 1986, but for the turning region
+   |z| near |order|, which recurrence in the order from Debye's expansions bridges.
+   docs/accuracy/special_complex.md has the measured errors. */
+
+#include "qx/types.h"
+
+QX_BEGIN_DECLS
+
+/** Bessel function J of real order, a solution of z^2 w'' + z w' + (z^2 - order^2) w = 0 (9.1).
+    scaled other than 0 multiplies by exp(-|Im z|). With |z| and |order| beyond about 1.3e5 a call
+    takes time in proportion to their cube root where they are close to each other, 0.2 ms at most.
+    Codes: ErrBesselStatusOne (order or z is NaN or infinite, or z is 0 and the order is negative
+    and no integer), ErrBesselStatusFour (|z| or |order| is above 2^31: no digit can be relied on),
+    ErrOverflow (the result exceeds the range), WarnLowAccuracy (|z| or |order| is above 4.7e7, so
+    that the rounding of the arguments leaves less than half the digits). */
+QX_API ErrorCode QX_CxBesselJr(double order, QX_IN const CDB *z, int32_t scaled,
+                               QX_OUT CDB *result);
+
+/** Bessel function Y of real order, (cos(order pi) J_order(z) - J_-order(z)) / sin(order pi), for
+    whole orders the limit (9.1.2). scaled other than 0 multiplies by exp(-|Im z|).
+    Codes: ErrBesselStatusOne (order or z is NaN or infinite, or z is 0), ErrBesselStatusFour (|z|
+    or |order| is above 2^31), ErrOverflow (the result exceeds the range), WarnLowAccuracy (|z| or
+    |order| is above 4.7e7). */
+QX_API ErrorCode QX_CxBesselYr(double order, QX_IN const CDB *z, int32_t scaled,
+                               QX_OUT CDB *result);
+
+/** Modified Bessel function I of real order, a solution of z^2 w'' + z w' - (z^2 + order^2) w = 0
+    (9.6). scaled other than 0 multiplies by exp(-|Re z|).
+    Codes: ErrBesselStatusOne (order or z is NaN or infinite, or z is 0 and the order is negative
+    and no integer), ErrBesselStatusFour (|z| or |order| is above 2^31), ErrOverflow (the result
+    exceeds the range), WarnLowAccuracy (|z| or |order| is above 4.7e7). */
+QX_API ErrorCode QX_CxBesselIr(double order, QX_IN const CDB *z, int32_t scaled,
+                               QX_OUT CDB *result);
+
+/** Modified Bessel function K of real order, pi / 2 (I_-order(z) - I_order(z)) / sin(order pi), for
+    whole orders the limit (9.6.2). scaled other than 0 multiplies by exp(z).
+    Codes: ErrBesselStatusOne (order or z is NaN or infinite, or z is 0), ErrBesselStatusFour (|z|
+    or |order| is above 2^31), ErrOverflow (the result exceeds the range), WarnLowAccuracy (|z| or
+    |order| is above 4.7e7). */
+QX_API ErrorCode QX_CxBesselKr(double order, QX_IN const CDB *z, int32_t scaled,
+                               QX_OUT CDB *result);
+
+/** Hankel function of the first kind and real order, J + i Y (9.1.3). scaled other than 0
+    multiplies by exp(-i z).
+    Codes: ErrBesselStatusOne (order or z is NaN or infinite, or z is 0), ErrBesselStatusFour (|z|
+    or |order| is above 2^31), ErrOverflow (the result exceeds the range), WarnLowAccuracy (|z| or
+    |order| is above 4.7e7). */
+QX_API ErrorCode QX_CxBesselH1r(double order, QX_IN const CDB *z, int32_t scaled,
+                                QX_OUT CDB *result);
+
+/** Hankel function of the second kind and real order, J - i Y (9.1.4). scaled other than 0
+    multiplies by exp(i z).
+    Codes: ErrBesselStatusOne (order or z is NaN or infinite, or z is 0), ErrBesselStatusFour (|z|
+    or |order| is above 2^31), ErrOverflow (the result exceeds the range), WarnLowAccuracy (|z| or
+    |order| is above 4.7e7). */
+QX_API ErrorCode QX_CxBesselH2r(double order, QX_IN const CDB *z, int32_t scaled,
+                                QX_OUT CDB *result);
+
+/** Airy function Ai, the solution of w'' = z w that falls along the positive axis (10.4). With zeta
+    = 2/3 z sqrt(z), scaled other than 0 multiplies by exp(zeta), which has a cut that Ai has not.
+    Codes: ErrBesselStatusOne (z is NaN or infinite), ErrBesselStatusFour (|zeta| is above 2^31),
+    ErrOverflow (the result exceeds the range), WarnLowAccuracy (|zeta| is above 4.7e7). */
+QX_API ErrorCode QX_CxAiryAi(QX_IN const CDB *z, int32_t scaled, QX_OUT CDB *result);
+
+/** As QX_CxAiryAi, the derivative of Ai. */
+QX_API ErrorCode QX_CxAiryAiP(QX_IN const CDB *z, int32_t scaled, QX_OUT CDB *result);
+
+/** Airy function Bi, the solution of w'' = z w that is in quadrature to Ai on the negative axis
+    (10.4). With zeta = 2/3 z sqrt(z), scaled other than 0 multiplies by exp(-|Re zeta|).
+    Codes: ErrBesselStatusOne (z is NaN or infinite), ErrBesselStatusFour (|zeta| is above 2^31),
+    ErrOverflow (the result exceeds the range), WarnLowAccuracy (|zeta| is above 4.7e7). */
+QX_API ErrorCode QX_CxAiryBi(QX_IN const CDB *z, int32_t scaled, QX_OUT CDB *result);
+
+/** As QX_CxAiryBi, the derivative of Bi. */
+QX_API ErrorCode QX_CxAiryBiP(QX_IN const CDB *z, int32_t scaled, QX_OUT CDB *result);
+
+QX_END_DECLS
+
+#endif

@@ -1,0 +1,44 @@
+#ifndef QX_SPECIAL_COMPLEX_EXPONENT_H
+#define QX_SPECIAL_COMPLEX_EXPONENT_H
+
+#include "frame/complex.h"
+#include "frame/extended.h"
+
+namespace qx {
+
+typedef CDB Complex;
+
+struct ExtendedComplex {
+    Extended re, im;
+};
+
+// factor exp(exponent). Kept apart, because the exponent may be beyond the range of exp and because
+// it needs more digits than the factor: an error in it is a relative error of the product.
+struct Exponential {
+    Complex factor;
+    ExtendedComplex exponent;
+};
+
+// Its value times exp(scale); infinite parts where it overflows, 0 where it underflows.
+Complex Value(const Exponential &term, const ExtendedComplex &scale);
+inline ExtendedComplex Plain(Complex z) { return {{z.re, 0}, {z.im, 0}}; }
+
+// sqrt(z) for a z with Im z >= 0, in the first quadrant.
+Complex RootOfUpperHalf(Complex z);
+// sqrt(z) of such a z with all digits of twice the precision but a few.
+ExtendedComplex ExtendedRoot(ExtendedComplex z);
+
+// The exponent of Debye's expansions, s - order ln((order + s) / z) with s = sqrt(order^2 + z^2),
+// for z in the first quadrant; absolute error about 2^-72 (order + |z|).
+struct DebyeExponent {
+    Complex s;
+    ExtendedComplex exponent;
+};
+DebyeExponent ExponentOfDebye(double order, Complex z);
+
+// The argument of re + i im, from -pi to pi; absolute error about 2^-70.
+Extended ExtendedArgument(Extended re, Extended im);
+
+} // namespace qx
+
+#endif

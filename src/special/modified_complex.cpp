@@ -1,0 +1,408 @@
+#include "special/modified_complex.h"
+
+#include "frame/constants.h"
+#include "special/extended.h"
+#include "special/rational.h"
+#include "special/reciprocal_gamma.h"
+#include "special/tables/bessel_complex.h"
+
+#include <algorithm>
+#include <cmath>
+#include <iterator>
+
+namespace qx {
+
+namespace {
+
+constexpr double kFar = 22;           // from where asymptotic sums have all digits
+constexpr double kDebyeFrom = 10;     // order, for smaller |z|
+constexpr double kTurningWidth = 8.2; // times max(|z|, order)^(1/3)
+constexpr double kAxisWidth = 1; // |Re z| up to which I is taken from K on both sides
+constexpr double kAxisFrom = 5;  // |z| from which it is
+constexpr double kNegligible = 0x1p-56;
+constexpr double kRootHalfPi = 0x1.40d931ff62706p+0;
+constexpr Complex kOne = {1, 0};
+
+constexpr int kSteps = 160;
+struct Inverses {
+    double of[kSteps + 1] = {};
+    constexpr Inverses() {
+        for (int n = 1; n <= kSteps; ++n)
+            of[n] = 1.0 / n;
+    }
+};
+constexpr Inverses inverse;
+
+double Modulus(Complex z) { return std::hypot(z.re, z.im); }
+double Size(Complex z) { return std::fabs(z.re) + std::fabs(z.im); }
+Complex Conjugate(Complex z) { return {z.re, -z.im}; }
+Complex Inverse(Complex z) {
+    const double scale = 1 / (z.re * z.re + z.im * z.im);
+    return {z.re * scale, -z.im * scale};
+}
+ExtendedComplex Negative(ExtendedComplex e) {
+    return {{-e.re.high, -e.re.low}, {-e.im.high, -e.im.low}};
+}
+Complex Difference(const ExtendedComplex &a, const ExtendedComplex &b) {
+    const ExtendedComplex less = Negative(b);
+    return {(a.re + less.re).high, (a.im + less.im).high};
+}
+Complex Exp(Complex z) { return Value({kOne, Plain(z)}, Plain({0, 0})); }
+Complex TurnByPi(double turns) { return {CosPi(turns), SinPi(turns)}; } // exp(i pi turns)
+Exponential Conjugate(const Exponential &term) {
+    const Extended im = term.exponent.im;
+    return {Conjugate(term.factor), {term.exponent.re, {-im.high, -im.low}}};
+}
+
+// Below, z lies in the first quadrant; for K as AxisI asks for it a little beyond.
+
+double TurningWidth(double order, double modulus) {
+    return kTurningWidth * std::cbrt(std::max(modulus, order));
+}
+
+bool DebyeHolds(double order, double modulus, Complex z) {
+    return (modulus >= kFar || order >= kDebyeFrom) &&
+           std::hypot(order - z.im, z.re) >= TurningWidth(order, modulus);
+}
+
+// The sum of an asymptotic series and that with alternating signs.
+struct Sums {
+    Complex plain, alternating;
+};
+
+// sum u_k / order^k, where u_k / order^k = P_k(order^2 / s^2) / s^k with real polynomials P_k, each
+// by the recurrence for real coefficients (D. E. Knuth, The art of computer programming, 4.6.4).
+Sums DebyeSums(double order, Complex s) {
+    const Complex step = Inverse(s);
+    const Complex q = step * step * (order * order);
+    const double twice = 2 * q.re;
+    const double square = q.re * q.re + q.im * q.im;
+    Sums sums = {kOne, kOne};
+    Complex power = step;
+    for (int k = 1; k < table::longDebyeCount; ++k) {
+        const double(&c)[table::longDebyeCount] = table::longDebye[k];
+        double upper = 0;
+        double lower = c[k];
+        for (int j = k - 1; j >= 1; --j) {
+            const double next = c[j] + twice * lower - square * upper;
+            upper = lower;
+            lower = next;
+        }
+        const Complex term = power * Complex{c[0] + q.re * lower - square * upper, q.im * lower};
+        sums.plain += term;
+        sums.alternating = k % 2 == 0 ? sums.alternating + term : sums.alternating - term;
+        if (Size(term) < kNegligible)
+            break;
+        power = power * step;
+    }
+    return sums;
+}
+
+Sums HankelSums(double order, Complex z) {
+    const Complex step = Inverse(z * 8);
+    const double square = 4 * order * order;
+    Sums sums = {kOne, kOne};
+    Complex term = kOne;
+    for (int k = 1; k < 48; ++k) {
+        const double odd = 2 * k - 1;
+        term = term * step * ((square - odd * odd) * inverse.of[k]);
+        sums.plain += term;
+        sums.alternating = k % 2 == 0 ? sums.alternating + term : sums.alternating - term;
+        if (Size(term) < kNegligible)
+            break;
+    }
+    return sums;
+}
+
+Exponential DebyeK(double order, Complex z) {
+    const DebyeExponent place = ExponentOfDebye(order, z);
+    const Complex scale = Inverse(RootOfUpperHalf(place.s)) * kRootHalfPi;
+    return {scale * DebyeSums(order, place.s).alternating, Negative(place.exponent)};
+}
+
+// exp(e) S(u) + i exp(i pi order) exp(-e) S(-u), over sqrt(2 pi s).
+ExponentialPair TwoExponentials(double order, Complex s, const ExtendedComplex &exponent,
+                                Complex growing, Complex decaying, bool hasSecond) {
+    const Complex scale = Inverse(RootOfUpperHalf(s)) * kInverseRootTwoPi;
+    ExponentialPair pair = {{scale * growing, exponent}, {{0, 0}, exponent}};
+    if (hasSecond)
+        pair.second = {scale * decaying * TurnByPi(order + 0.5), Negative(exponent)};
+    return pair;
+}
+
+ExponentialPair DebyeI(double order, Complex z) {
+    const DebyeExponent place = ExponentOfDebye(order, z);
+    const Sums sums = DebyeSums(order, place.s);
+    const bool isBeyondStokesLine = z.im > order && place.exponent.im.high > kHalfPi * order;
+    return TwoExponentials(order, place.s, place.exponent, sums.plain, sums.alternating,
+                           isBeyondStokesLine && place.exponent.re.high < 20);
+}
+
+ExponentialPair HankelI(double order, Complex z) {
+    const Sums sums = HankelSums(order, z);
+    return TwoExponentials(order, z, Plain(z), sums.alternating, sums.plain, z.re < 20);
+}
+
+Exponential HankelK(double order, Complex z) {
+    const Complex scale = Inverse(RootOfUpperHalf(z)) * kRootHalfPi;
+    return {scale * HankelSums(order, z).plain, Plain(-z)};
+}
+
+double ReciprocalGammaNextToOne(double mu) { // 1 / gamma(1 + mu), |mu| <= 1/2
+    return Horner(table::reciprocalGamma, mu);
+}
+
+// (z/2)^order / gamma(order + 1) sum (z^2/4)^k / (k! (order + 1)_k)
+Exponential SeriesI(double order, Complex z, double modulus) {
+    const Complex half = z * 0.5;
+    const Complex square = half * half;
+    Complex term = kOne;
+    Complex sum = kOne;
+    for (int k = 1; k < 60; ++k) {
+        term = term * square / (k * (order + k));
+        sum += term;
+        if (Size(term) < kNegligible * Size(sum))
+            break;
+    }
+    const Extended angle = ExtendedArgument({z.re, 0}, {z.im, 0}) * Extended{order, 0};
+    // ln |z| less that of the rounded modulus, which the power multiplies by the order
+    const Extended square2 = ExactProduct(z.re, z.re) + ExactProduct(z.im, z.im);
+    const Extended rounded = ExactProduct(modulus, modulus);
+    const double rest = ((square2.high - rounded.high) + (square2.low - rounded.low)) /
+                        (2 * rounded.high);
+    double correction = rounded.high > 1e-250 ? rest * order : 0;
+    if (order < 20) // and gamma takes a rounded order + 1
+        correction -= ExactSum(order, 1).low * (std::log(order + 1) - 0.5 / (order + 1));
+    const Extended size = {0, correction};
+    return {sum * PowerOverGamma(0.5 * modulus, order), {size, angle}};
+}
+
+// order = mu + m with |mu| <= 1/2.
+struct SplitOrder {
+    double mu;
+    int m;
+    explicit SplitOrder(double order)
+        : mu(order - std::floor(order + 0.5)), m(static_cast<int>(std::floor(order + 0.5))) {}
+};
+
+// I_(mu + k) downwards from any start, normalised by
+// (z/2)^mu exp(z) = gamma(1 + mu) (I_mu + sum 2 (mu + k) (2 mu + 1)_(k-1) / k! I_(mu + k)).
+Exponential MillerI(double order, Complex z, double modulus) {
+    const SplitOrder split(order);
+    const double reach = std::max(modulus, order);
+    const int start = static_cast<int>(reach + 9 * std::cbrt(reach)) + 6;
+    const Complex step = Inverse(z) * 2;
+    const double mu = split.mu;
+    Complex above = {0, 0};
+    Complex p = kOne;
+    Complex sum = p; // of the terms from k on, over the weight of k
+    Complex wanted = p;
+    for (int k = start; k >= 1; --k) {
+        const Complex below = above + step * p * (mu + k);
+        above = p;
+        p = below;
+        const double weight = k == 1 ? 2 * (mu + 1)
+                                     : (mu + k) * (2 * mu + (k - 1)) /
+                                           ((mu + (k - 1)) * k); // of k over that of k - 1
+        sum = p + sum * weight;
+        if (k - 1 == split.m)
+            wanted = p;
+    }
+    const Complex half = z * 0.5;
+    const Complex power =
+        Exp(Complex{std::log(0.5 * modulus), std::atan2(half.im, half.re)} * mu);
+    return {wanted * Inverse(sum) * power * ReciprocalGammaNextToOne(mu), Plain(z)};
+}
+
+// K_mu and K_(mu+1).
+struct TwoOrders {
+    Complex first, second;
+    ExtendedComplex exponent;
+};
+
+// K_mu = sqrt(pi / (2 z)) exp(-z) U_0 / sum C_n U_n, where U_n is the confluent function
+// U(mu + 1/2 + n, 2 mu + 1, 2 z), C_n = (1/2 + mu)_n (1/2 - mu)_n / n!, and the U_n come downwards
+// from any start. Below, n! U_n.
+TwoOrders MillerK(double mu, Complex z, double modulus) {
+    const int start = std::min(static_cast<int>(400 / (modulus + z.re)) + 9, kSteps - 1);
+    const auto coefficient = [mu](int n) { return (n - 0.5) * (n - 0.5) - mu * mu; };
+    Complex above = {0, 0};
+    Complex u = kOne;
+    Complex sum = u; // of C_m U_m from m = n on, over C_n / n!
+    for (int n = start; n >= 1; --n) {
+        const Complex below =
+            (z + n) * u * (2 * inverse.of[n]) -
+            above * (coefficient(n + 1) * (inverse.of[n] * inverse.of[n + 1]));
+        above = u;
+        u = below;
+        sum = u + sum * (coefficient(n) * (inverse.of[n] * inverse.of[n]));
+    }
+    const Complex first = Inverse(RootOfUpperHalf(z)) * kRootHalfPi * u * Inverse(sum);
+    const Complex ratio =
+        (z + (mu + 0.5) - above * Inverse(u) * coefficient(1)) * Inverse(z);
+    return {first, first * ratio, Plain(-z)};
+}
+
+// The two series of Temme about z = 0.
+TwoOrders SeriesK(double mu, Complex z, double modulus) {
+    double even = 0; // (1 / gamma(1 - mu) + 1 / gamma(1 + mu)) / 2
+    double odd = 0;  // (1 / gamma(1 - mu) - 1 / gamma(1 + mu)) / (2 mu)
+    for (int k = static_cast<int>(std::size(table::reciprocalGamma)) - 2; k >= 0; k -= 2) {
+        even = even * (mu * mu) + table::reciprocalGamma[k];
+        odd = odd * (mu * mu) - table::reciprocalGamma[k + 1];
+    }
+    const Complex half = z * 0.5;
+    const Complex square = half * half;
+    const Complex logarithm = {-std::log(0.5 * modulus), -std::atan2(half.im, half.re)};
+    const Complex sigma = logarithm * mu;
+    const Complex grow = Exp(sigma); // (z/2)^-mu
+    const Complex decay = Exp(-sigma);
+    const Complex sine = (grow - decay) * 0.5;
+    const double sigmaSize = Size(sigma);
+    Complex sinc = kOne; // sinh(sigma) / sigma
+    if (sigmaSize > 0.5) {
+        sinc = sine / sigma;
+    } else if (sigmaSize > 0) {
+        const Complex w = sigma * sigma;
+        for (int k = 8; k >= 1; --k)
+            sinc = kOne + w * sinc * (1.0 / (2 * k * (2 * k + 1)));
+    }
+    const double reflected = mu == 0 ? 1 : kPi * mu / SinPi(mu);
+    Complex f = ((grow + decay) * (0.5 * odd) + sinc * logarithm * even) * reflected;
+    // gamma(1 + mu) / 2 and gamma(1 - mu) / 2
+    Complex p = grow * (0.5 / (even - mu * odd));
+    Complex q = decay * (0.5 / (even + mu * odd));
+    Complex c = kOne;
+    Complex first = f;
+    Complex second = p;
+    for (int k = 1; k < 40; ++k) {
+        f = (f * k + p + q) / (k * k - mu * mu);
+        p = p / (k - mu);
+        q = q / (k + mu);
+        c = c * square * inverse.of[k];
+        const Complex term = c * f;
+        const Complex other = c * (p - f * k);
+        first += term;
+        second += other;
+        if (Size(term) < kNegligible * Size(first) && Size(other) < kNegligible * Size(second))
+            break;
+    }
+    return {first, second / half, Plain({0, 0})};
+}
+
+// K_(order + steps) from K_order and K_(order + 1).
+Exponential Upwards(double order, int steps, Complex z, const TwoOrders &start) {
+    const Complex step = Complex{2, 0} / z; // z may be tiny
+    Complex lower = start.first;
+    Complex upper = start.second;
+    for (int k = 1; k <= steps; ++k) {
+        const Complex next = lower + step * upper * (order + k);
+        lower = upper;
+        upper = next;
+    }
+    return {lower, start.exponent};
+}
+
+// The value of a pair over exp(exponent).
+Complex Over(const ExtendedComplex &exponent, const ExponentialPair &pair) {
+    Complex sum = pair.first.factor * Exp(Difference(pair.first.exponent, exponent));
+    if (Size(pair.second.factor) != 0)
+        sum += pair.second.factor * Exp(Difference(pair.second.exponent, exponent));
+    return sum;
+}
+
+TwoOrders Joined(const Exponential &first, const Exponential &second) {
+    return {first.factor, second.factor * Exp(Difference(second.exponent, first.exponent)),
+            first.exponent};
+}
+
+// Next to the turning point: down from an order above it.
+Exponential TurningI(double order, Complex z, double modulus) {
+    const double width = TurningWidth(0, modulus + TurningWidth(0, modulus) + 2);
+    const double wide = std::sqrt(width * width - z.re * z.re);
+    const int steps = std::max(1, static_cast<int>(std::ceil(z.im + wide - order)));
+    const ExponentialPair highest = DebyeI(order + steps + 1, z);
+    const ExponentialPair high = DebyeI(order + steps, z);
+    const ExtendedComplex exponent = high.first.exponent;
+    const Complex step = Inverse(z) * 2;
+    Complex above = Over(exponent, highest);
+    Complex p = Over(exponent, high);
+    for (int k = steps; k >= 1; --k) {
+        const Complex below = above + step * p * (order + k);
+        above = p;
+        p = below;
+    }
+    return {p, exponent};
+}
+
+// Next to the turning point: up from an order below it, or from next to 0.
+Exponential TurningK(double order, Complex z, double modulus) {
+    const double width = TurningWidth(0, modulus);
+    const double wide = std::sqrt(std::max(0.0, width * width - z.re * z.re));
+    const int steps = static_cast<int>(std::ceil(order - (z.im - wide))) + 1;
+    const double low = order - steps;
+    if (low * low >= modulus && low > 0)
+        return Upwards(low, steps, z, Joined(DebyeK(low, z), DebyeK(low + 1, z)));
+    const SplitOrder split(order);
+    return Upwards(split.mu, split.m, z,
+                   Joined(HankelK(std::fabs(split.mu), z), HankelK(split.mu + 1, z)));
+}
+
+Exponential UpperK(double order, Complex z);
+
+// Next to the imaginary axis, where I oscillates: by K on both sides of the axis,
+// i pi I(z) = K(z exp(-i pi)) - exp(i pi order) K(z), with no recurrence through the turning point.
+ExponentialPair AxisI(double order, Complex z) {
+    const Exponential mirrored = Conjugate(UpperK(order, {-z.re, z.im}));
+    const Exponential same = UpperK(order, z);
+    const Complex turn = TurnByPi(order + 0.5);
+    return {{mirrored.factor * Complex{0, -kInversePi}, mirrored.exponent},
+            {same.factor * turn * kInversePi, same.exponent}};
+}
+
+ExponentialPair UpperI(double order, Complex z) {
+    const double modulus = Modulus(z);
+    const ExtendedComplex none = Plain({0, 0});
+    if (0.25 * modulus * modulus <= order + 1)
+        return {SeriesI(order, z, modulus), {{0, 0}, none}};
+    if (modulus >= kFar && order * order <= 2 * modulus)
+        return HankelI(order, z);
+    if (DebyeHolds(order, modulus, z))
+        return DebyeI(order, z);
+    if (z.re <= kAxisWidth && z.im > order && modulus > kAxisFrom)
+        return AxisI(order, z);
+    if (modulus < kFar)
+        return {MillerI(order, z, modulus), {{0, 0}, none}};
+    return {TurningI(order, z, modulus), {{0, 0}, none}};
+}
+
+Exponential UpperK(double order, Complex z) {
+    const double modulus = Modulus(z);
+    if (modulus >= kFar && order * order <= 2 * modulus)
+        return HankelK(order, z);
+    if (order >= kDebyeFrom && modulus < 1e-60)
+        return {{kInfinity, 0}, Plain({0, 0})};
+    if (DebyeHolds(order, modulus, z))
+        return DebyeK(order, z);
+    if (modulus >= kFar)
+        return TurningK(order, z, modulus);
+    const SplitOrder split(order);
+    return Upwards(split.mu, split.m, z,
+                   modulus + z.re <= 3 ? SeriesK(split.mu, z, modulus)
+                                       : MillerK(split.mu, z, modulus));
+}
+
+} // namespace
+
+ExponentialPair ModifiedI(double order, Complex z) {
+    if (!std::signbit(z.im))
+        return UpperI(order, z);
+    const ExponentialPair pair = UpperI(order, Conjugate(z));
+    return {Conjugate(pair.first), Conjugate(pair.second)};
+}
+
+Exponential ModifiedK(double order, Complex z) {
+    return std::signbit(z.im) ? Conjugate(UpperK(order, Conjugate(z))) : UpperK(order, z);
+}
+
+} // namespace qx
