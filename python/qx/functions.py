@@ -303,6 +303,14 @@ def many(*values):
     return any(np.ndim(value) for value in values)
 
 
+# Functions whose calls over arrays the stand-in host makes, by what they return and take.
+LOOPS = {
+    ("ErrorCode", ("reference", "CDB"), ("value", "I32"), ("output", "CDB")): "QXHostCallsOfComplex",
+    ("ErrorCode", ("value", "DBL"), ("reference", "CDB"), ("value", "I32"), ("output", "CDB")):
+        "QXHostCallsOfOrderAndComplex",
+}
+
+
 def mapped(entry, function, values):
     """A function of scalars over arrays, element by element, with NumPy's broadcasting. The
     function writes straight into the elements of the result."""
@@ -317,11 +325,12 @@ def mapped(entry, function, values):
     shape, n = spread[0].shape, spread[0].size
     spread = iter(spread)
     columns, kept, results, codes = [], [], [], None
+    loop = LOOPS.get((entry["returns"], *((a["kind"], a["element"]) for a in entry["arguments"])))
     for argument in entry["arguments"]:
         dtype = arrays.element_dtype(argument["element"])
         if is_given(argument):
             data = np.ascontiguousarray(next(spread), dtype).ravel()
-            if argument["kind"] == "value":
+            if argument["kind"] == "value" and not loop:
                 columns.append(data.tolist())
                 continue
         else:
@@ -333,9 +342,13 @@ def mapped(entry, function, values):
         kept.append(data)  # only its address goes into the calls
         start = data.ctypes.data
         columns.append(range(start, start + n * dtype.itemsize, dtype.itemsize))
-    found = [function(*row) for row in zip(*columns)]
-    if entry["returns"] == "ErrorCode":
-        codes = np.array(found, np.int32)
+    if loop:
+        codes = np.zeros(n, np.int32)
+        getattr(library().host, loop)(function, n, *(data.ctypes.data for data in kept), codes.ctypes.data)
+    else:
+        found = [function(*row) for row in zip(*columns)]
+        if entry["returns"] == "ErrorCode":
+            codes = np.array(found, np.int32)
     if codes is not None:
         _tell_first(entry["name"], codes)
     if gives_value(entry):

@@ -30,7 +30,8 @@ struct UpperPlane {
     Complex sum(const ExponentialPair &pair, Complex factor) const {
         return (Value(pair.first, scale) + Value(pair.second, scale)) * factor;
     }
-    // There J and Y are the parts of H1, and come without the long way of I around the turning point.
+    // There J and Y are the parts of H1, and come without the long way of I around the turning
+    // point.
     bool isOscillatingOnAxis() const { return z.im == 0 && z.re > kAxisFrom && z.re > order; }
     Complex turned() const { return {z.im, -z.re}; } // -i z
     Complex j() const {
@@ -93,28 +94,24 @@ Complex OfI(const UpperPlane &plane, bool isNegative) {
     return sum * TurnByPi(-plane.order);
 }
 
-// On the positive real axis below the turning point H1 has J as a real part that is lost in Y.
+// J + i Y on the positive real axis, where both are real. Below the turning point J is far smaller
+// than Y and would be lost in it.
+Complex OnAxis(const UpperPlane &plane) {
+    const UpperPlane plain = {plane.order, plane.z, kNone};
+    const Complex h1 = plain.h1();
+    return plane.z.re < plane.order ? Complex{plain.j().re, h1.im} : h1;
+}
+
 Complex OfH1(const UpperPlane &plane, bool isNegative) {
-    Complex value;
-    if (plane.z.im == 0 && plane.z.re > 0 && plane.z.re < plane.order) {
-        const UpperPlane plain = {plane.order, plane.z, kNone};
-        const Complex axis = {plain.j().re, plain.h1().im};
-        value = Value({axis, kNone}, plane.scale);
-    } else {
-        value = plane.h1();
-    }
+    const bool isAxis = plane.z.im == 0 && plane.z.re > 0;
+    const Complex value = isAxis ? Value({OnAxis(plane), kNone}, plane.scale) : plane.h1();
     return isNegative ? value * TurnByPi(plane.order) : value;
 }
 
 Complex OfH2(const UpperPlane &plane, bool isNegative) {
-    Complex value;
-    if (plane.z.im == 0 && plane.z.re > 0 && plane.z.re < plane.order) {
-        const UpperPlane plain = {plane.order, plane.z, kNone};
-        const Complex axis = {plain.j().re, -plain.h1().im};
-        value = Value({axis, kNone}, plane.scale);
-    } else {
-        value = plane.j() * 2 - plane.h1();
-    }
+    const bool isAxis = plane.z.im == 0 && plane.z.re > 0;
+    const Complex value =
+        isAxis ? Value({Conjugate(OnAxis(plane)), kNone}, plane.scale) : plane.j() * 2 - plane.h1();
     return isNegative ? value * TurnByPi(-plane.order) : value;
 }
 
@@ -171,9 +168,7 @@ ComplexValue AtZero(BesselKind kind, double order) {
     return {{order == 0 ? 1.0 : 0.0, 0}, BesselStatus::Good};
 }
 
-bool IsRealOnRealAxis(BesselKind kind) {
-    return kind != BesselKind::H1 && kind != BesselKind::H2;
-}
+bool IsRealOnRealAxis(BesselKind kind) { return kind != BesselKind::H1 && kind != BesselKind::H2; }
 
 } // namespace
 
@@ -241,8 +236,8 @@ Complex AiryFromBessel(AiryKind kind, Complex z, const ExtendedComplex &zeta, bo
                        const ExtendedComplex &scale) {
     const bool isDerivative = IsDerivative(kind);
     const double order = isDerivative ? 0x1.5555555555555p-1 : 0x1.5555555555555p-2;
-    const Complex place = isTurned ? Complex{-zeta.re.high, -zeta.im.high}
-                                   : Complex{zeta.re.high, zeta.im.high};
+    const Complex place =
+        isTurned ? Complex{-zeta.re.high, -zeta.im.high} : Complex{zeta.re.high, zeta.im.high};
     const double sign = isTurned ? -1 : 1;
     const ExtendedComplex rest = {{sign * zeta.re.low, 0}, {sign * zeta.im.low, 0}};
     const auto valueOfK = [&] {
@@ -301,8 +296,8 @@ ComplexValue ComplexAiry(AiryKind kind, CDB z, bool isScaled) {
     const double side = zeta.re.high < 0 ? 1 : -1;
     ExtendedComplex scale = kNone;
     if (isScaled)
-        scale = IsAi(kind) ? zeta
-                           : ExtendedComplex{{side * zeta.re.high, side * zeta.re.low}, {0, 0}};
+        scale =
+            IsAi(kind) ? zeta : ExtendedComplex{{side * zeta.re.high, side * zeta.re.low}, {0, 0}};
     // Ai is real on the negative axis, its scaled form is not.
     const bool isRealAxis = z.im == 0;
     const bool isScaledLast = modulus <= kSeriesLimit || (isRealAxis && z.re < 0);

@@ -10,10 +10,10 @@ namespace qx {
 // What became of a call; in the order in which it is decided.
 enum class BesselStatus {
     Good = 0,
-    Singular = 1,  // an argument that is not finite, or a singularity
-    Overflow = 2,  // the result exceeds the range
-    HalfLost = 3,  // the rounding of the arguments leaves less than half the digits
-    AllLost = 4,   // ... leaves none that are worth computing
+    Singular = 1, // an argument that is not finite, or a singularity
+    Overflow = 2, // the result exceeds the range
+    HalfLost = 3, // the rounding of the arguments leaves less than half the digits
+    AllLost = 4,  // ... leaves none that are worth computing
 };
 
 struct ComplexValue {

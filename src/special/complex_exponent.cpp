@@ -73,7 +73,8 @@ Complex RootOfUpperHalf(Complex z) {
 
 ExtendedComplex ExtendedRoot(ExtendedComplex z) { // one step of Newton's
     const Complex root = RootOfUpperHalf({z.re.high, z.im.high});
-    const Extended square = Difference(ExactProduct(root.re, root.re), ExactProduct(root.im, root.im));
+    const Extended square =
+        Difference(ExactProduct(root.re, root.re), ExactProduct(root.im, root.im));
     const Complex rest = {Difference(z.re, square).high,
                           Difference(z.im, Twice(ExactProduct(root.re, root.im))).high};
     const Complex step = rest / (root * 2);
@@ -84,16 +85,15 @@ DebyeExponent ExponentOfDebye(double order, Complex z) {
     // order^2 + z^2 = x^2 - (y + order) (y - order) + 2 i x y
     const Extended squareX = ExactProduct(z.re, z.re);
     const Extended crossed = ExactSum(z.im, order) * ExactSum(z.im, -order);
-    const ExtendedComplex s = ExtendedRoot(
-        {Difference(squareX, crossed), Twice(ExactProduct(z.re, z.im))});
+    const ExtendedComplex s =
+        ExtendedRoot({Difference(squareX, crossed), Twice(ExactProduct(z.re, z.im))});
     const Extended v = {order, 0};
     const Extended x = {z.re, 0};
     const Extended y = {z.im, 0};
     const ExtendedComplex a = {v + s.re, s.im};
     const Extended logarithm =
         LogOfQuotient(a.re * a.re + a.im * a.im, squareX + ExactProduct(z.im, z.im));
-    const Extended angle =
-        ExtendedArgument(a.re * x + a.im * y, Difference(a.im * x, a.re * y));
+    const Extended angle = ExtendedArgument(a.re * x + a.im * y, Difference(a.im * x, a.re * y));
     return {{s.re.high, s.im.high},
             {Difference(s.re, v * Half(logarithm)), Difference(s.im, v * angle)}};
 }
@@ -103,10 +103,14 @@ Complex Value(const Exponential &term, const ExtendedComplex &scale) {
         return {0, 0};
     const Extended re = term.exponent.re + scale.re;
     const Extended im = term.exponent.im + scale.im;
-    const double sine = std::sin(im.high);
-    const double cosine = std::cos(im.high);
-    const Complex direction = {cosine - sine * im.low, sine + cosine * im.low};
-    const Complex value = term.factor * direction;
+    Complex value = term.factor;
+    if (im.high != 0) {
+        const double sine = std::sin(im.high);
+        const double cosine = std::cos(im.high);
+        value = value * Complex{cosine - sine * im.low, sine + cosine * im.low};
+    }
+    if (re.high == 0 && re.low == 0)
+        return value;
     if (std::fabs(re.high) < 700) {
         const double size = std::exp(re.high);
         return value * (size + size * re.low);

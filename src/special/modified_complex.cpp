@@ -17,8 +17,8 @@ namespace {
 constexpr double kFar = 22;           // from where asymptotic sums have all digits
 constexpr double kDebyeFrom = 10;     // order, for smaller |z|
 constexpr double kTurningWidth = 8.2; // times max(|z|, order)^(1/3)
-constexpr double kAxisWidth = 1; // |Re z| up to which I is taken from K on both sides
-constexpr double kAxisFrom = 5;  // |z| from which it is
+constexpr double kAxisWidth = 1;      // |Re z| up to which I is taken from K on both sides
+constexpr double kAxisFrom = 5;       // |z| from which it is
 constexpr double kNegligible = 0x1p-56;
 constexpr double kRootHalfPi = 0x1.40d931ff62706p+0;
 constexpr Complex kOne = {1, 0};
@@ -152,6 +152,20 @@ double ReciprocalGammaNextToOne(double mu) { // 1 / gamma(1 + mu), |mu| <= 1/2
     return Horner(table::reciprocalGamma, mu);
 }
 
+// What the logarithm of (|z|/2)^order / gamma(order + 1) lacks through the rounding of the modulus,
+// which the power multiplies by the order, and of order + 1, of which gamma is taken below 20.
+double RoundingInPower(double order, Complex z, double modulus) {
+    const Extended square = ExactProduct(z.re, z.re) + ExactProduct(z.im, z.im);
+    const Extended rounded = ExactProduct(modulus, modulus);
+    double rest = 0;
+    if (rounded.high > 1e-250)
+        rest = order * ((square.high - rounded.high) + (square.low - rounded.low)) /
+               (2 * rounded.high);
+    if (order < 20)
+        rest -= ExactSum(order, 1).low * (std::log(order + 1) - 0.5 / (order + 1));
+    return rest;
+}
+
 // (z/2)^order / gamma(order + 1) sum (z^2/4)^k / (k! (order + 1)_k)
 Exponential SeriesI(double order, Complex z, double modulus) {
     const Complex half = z * 0.5;
@@ -164,17 +178,13 @@ Exponential SeriesI(double order, Complex z, double modulus) {
         if (Size(term) < kNegligible * Size(sum))
             break;
     }
+    if (order == 0)
+        return {sum, Plain({0, 0})};
+    const double size = PowerOverGamma(0.5 * modulus, order);
+    if (order < 4)
+        return {sum * size, Plain({0, order * std::atan2(z.im, z.re)})};
     const Extended angle = ExtendedArgument({z.re, 0}, {z.im, 0}) * Extended{order, 0};
-    // ln |z| less that of the rounded modulus, which the power multiplies by the order
-    const Extended square2 = ExactProduct(z.re, z.re) + ExactProduct(z.im, z.im);
-    const Extended rounded = ExactProduct(modulus, modulus);
-    const double rest = ((square2.high - rounded.high) + (square2.low - rounded.low)) /
-                        (2 * rounded.high);
-    double correction = rounded.high > 1e-250 ? rest * order : 0;
-    if (order < 20) // and gamma takes a rounded order + 1
-        correction -= ExactSum(order, 1).low * (std::log(order + 1) - 0.5 / (order + 1));
-    const Extended size = {0, correction};
-    return {sum * PowerOverGamma(0.5 * modulus, order), {size, angle}};
+    return {sum * size, {{0, RoundingInPower(order, z, modulus)}, angle}};
 }
 
 // order = mu + m with |mu| <= 1/2.
@@ -209,8 +219,7 @@ Exponential MillerI(double order, Complex z, double modulus) {
             wanted = p;
     }
     const Complex half = z * 0.5;
-    const Complex power =
-        Exp(Complex{std::log(0.5 * modulus), std::atan2(half.im, half.re)} * mu);
+    const Complex power = Exp(Complex{std::log(0.5 * modulus), std::atan2(half.im, half.re)} * mu);
     return {wanted * Inverse(sum) * power * ReciprocalGammaNextToOne(mu), Plain(z)};
 }
 
@@ -230,16 +239,14 @@ TwoOrders MillerK(double mu, Complex z, double modulus) {
     Complex u = kOne;
     Complex sum = u; // of C_m U_m from m = n on, over C_n / n!
     for (int n = start; n >= 1; --n) {
-        const Complex below =
-            (z + n) * u * (2 * inverse.of[n]) -
-            above * (coefficient(n + 1) * (inverse.of[n] * inverse.of[n + 1]));
+        const Complex below = (z + n) * u * (2 * inverse.of[n]) -
+                              above * (coefficient(n + 1) * (inverse.of[n] * inverse.of[n + 1]));
         above = u;
         u = below;
         sum = u + sum * (coefficient(n) * (inverse.of[n] * inverse.of[n]));
     }
     const Complex first = Inverse(RootOfUpperHalf(z)) * kRootHalfPi * u * Inverse(sum);
-    const Complex ratio =
-        (z + (mu + 0.5) - above * Inverse(u) * coefficient(1)) * Inverse(z);
+    const Complex ratio = (z + (mu + 0.5) - above * Inverse(u) * coefficient(1)) * Inverse(z);
     return {first, first * ratio, Plain(-z)};
 }
 

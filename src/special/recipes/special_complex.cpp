@@ -15,14 +15,13 @@ Recipe OfOrder(const char *name, Bessel function) {
                 const struct {
                     double order;
                     ::CDB z;
-                } points[] = {
-                    {0.0, {0.02 * x, 0.01}},       {1.3, {-0.1 * x, 0.4}},
-                    {-2.5, {0.3 * x, -0.2 * x}},   {3.0, {4.0, 0.6 * x}},
-                    {-0.25, {-1.1 * x, -0.0}},     {0.5 * x, {0.1 * x, 0.2 * x}},
-                    {7.0 * x, {7.2 * x, 0.7}},     {-9.1 * x, {9.0 * x, -2.0}},
-                    {2.5, {30.0 + x, 20.0}},       {40.0 + x, {0.3, -55.0}},
-                    {11.0, {0.4, 12.0 + 0.1 * x}}, {0.4, {0.0, 6.0 + x}},
-                    {60.5, {61.0 + 0.2 * x, 0.0}}, {-4.0, {12.5, 3.0}}};
+                } points[] = {{0.0, {0.02 * x, 0.01}},       {1.3, {-0.1 * x, 0.4}},
+                              {-2.5, {0.3 * x, -0.2 * x}},   {3.0, {4.0, 0.6 * x}},
+                              {-0.25, {-1.1 * x, -0.0}},     {0.5 * x, {0.1 * x, 0.2 * x}},
+                              {7.0 * x, {7.2 * x, 0.7}},     {-9.1 * x, {9.0 * x, -2.0}},
+                              {2.5, {30.0 + x, 20.0}},       {40.0 + x, {0.3, -55.0}},
+                              {11.0, {0.4, 12.0 + 0.1 * x}}, {0.4, {0.0, 6.0 + x}},
+                              {60.5, {61.0 + 0.2 * x, 0.0}}, {-4.0, {12.5, 3.0}}};
                 int output = 0;
                 for (const int32_t scaled : {0, 1})
                     for (const auto &p : points)
@@ -36,8 +35,8 @@ Recipe OfOrder(const char *name, Bessel function) {
 Recipe OfArgument(const char *name, Airy function) {
     return {name, [function](Call &c) {
                 const double x = c.n;
-                const ::CDB points[] = {{0.03 * x, 0.2},   {-0.2 * x, 0.1},  {0.4 * x, -0.3 * x},
-                                        {0.0, 0.7 * x},    {-0.9 * x, 0.0},  {-0.9 * x, -0.0},
+                const ::CDB points[] = {{0.03 * x, 0.2},     {-0.2 * x, 0.1},  {0.4 * x, -0.3 * x},
+                                        {0.0, 0.7 * x},      {-0.9 * x, 0.0},  {-0.9 * x, -0.0},
                                         {2.5 + 0.01 * x, 0}, {-12.0, 6.0 + x}, {14.0, -x}};
                 int output = 0;
                 for (const int32_t scaled : {0, 1})
@@ -50,16 +49,11 @@ Recipe OfArgument(const char *name, Airy function) {
 
 std::vector<Recipe> SpecialComplexRecipes() {
     return {
-        OfOrder("QX_CxBesselJr", QX_CxBesselJr),
-        OfOrder("QX_CxBesselYr", QX_CxBesselYr),
-        OfOrder("QX_CxBesselIr", QX_CxBesselIr),
-        OfOrder("QX_CxBesselKr", QX_CxBesselKr),
-        OfOrder("QX_CxBesselH1r", QX_CxBesselH1r),
-        OfOrder("QX_CxBesselH2r", QX_CxBesselH2r),
-        OfArgument("QX_CxAiryAi", QX_CxAiryAi),
-        OfArgument("QX_CxAiryAiP", QX_CxAiryAiP),
-        OfArgument("QX_CxAiryBi", QX_CxAiryBi),
-        OfArgument("QX_CxAiryBiP", QX_CxAiryBiP),
+        OfOrder("QX_CxBesselJr", QX_CxBesselJr),   OfOrder("QX_CxBesselYr", QX_CxBesselYr),
+        OfOrder("QX_CxBesselIr", QX_CxBesselIr),   OfOrder("QX_CxBesselKr", QX_CxBesselKr),
+        OfOrder("QX_CxBesselH1r", QX_CxBesselH1r), OfOrder("QX_CxBesselH2r", QX_CxBesselH2r),
+        OfArgument("QX_CxAiryAi", QX_CxAiryAi),    OfArgument("QX_CxAiryAiP", QX_CxAiryAiP),
+        OfArgument("QX_CxAiryBi", QX_CxAiryBi),    OfArgument("QX_CxAiryBiP", QX_CxAiryBiP),
     };
 }
 
