@@ -324,6 +324,23 @@ class Scalars(unittest.TestCase):
         self.assertLess(caught.exception.code, 0)
         self.assertEqual(qx.call("NormDist_head", [-np.inf, np.inf]).tolist(), [0.0, 1.0])
 
+    @unittest.skipUnless("QX_CxBesselJr" in qx.names(), "not in this build")
+    def test_functions_of_complex_numbers_map_over_arrays(self):
+        z = np.array([[1 + 2j, -3.0], [complex(-2, -0.0), 40j]])
+        found = qx.call("QX_CxBesselKr", 0.5, z, [1, 1])  # sqrt(pi / (2 z)) of the sides of z
+        np.testing.assert_allclose(found, np.sqrt(np.pi / 2) / np.sqrt(z), rtol=1e-14)
+        self.assertEqual(qx.call("QX_CxBesselKr", 0.5, -3, 1), found[0, 1])
+        orders = np.arange(3.0)[:, np.newaxis]
+        self.assertEqual(qx.call("QX_CxBesselJr", orders, z[0], 0).shape, (3, 2))
+        airy = qx.call("QX_CxAiryAi", z, 0)
+        self.assertEqual(airy[1, 1], qx.call("QX_CxAiryAi", 40j, 0))
+        self.assertEqual(qx.call("QX_CxAiryAi", [], 0).shape, (0,))
+        with self.assertRaisesRegex(qx.QxError, "at element 1"):
+            qx.call("QX_CxBesselYr", 1.0, [1j, 0, 2], 0)
+        with self.assertWarns(qx.QxWarning):
+            qx.call("QX_CxBesselJr", 0.0, [1.0, 5e7], 0)
+        self.assertRaises(TypeError, qx.call, "QX_CxBesselJr", z, z, 0)
+
     @unittest.skipUnless("QX_BesselJr" in qx.names(), "not in this build")
     def test_several_results_and_values(self):
         x = np.array([[0.5, 1.0], [2.0, 40.0]])

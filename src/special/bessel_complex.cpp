@@ -277,8 +277,7 @@ ExtendedComplex ZetaOf(Complex z) {
     const Extended y = {z.im, 0};
     const ExtendedComplex root = ExtendedRoot({x, y});
     const Extended crossed = y * root.im;
-    return {twoThirds * (x * root.re + Extended{-crossed.high, -crossed.low}),
-            twoThirds * (x * root.im + y * root.re)};
+    return {twoThirds * (x * root.re - crossed), twoThirds * (x * root.im + y * root.re)};
 }
 
 } // namespace

@@ -9,8 +9,6 @@ namespace qx {
 
 namespace {
 
-Extended Negative(Extended a) { return {-a.high, -a.low}; }
-Extended Difference(Extended a, Extended b) { return a + Negative(b); }
 Extended Twice(Extended a) { return {2 * a.high, 2 * a.low}; }
 Extended Half(Extended a) { return {0.5 * a.high, 0.5 * a.low}; }
 
@@ -35,8 +33,8 @@ Extended LogOfQuotient(Extended a, Extended b) {
 } // namespace
 
 Extended ExtendedArgument(Extended re, Extended im) {
-    Extended x = re.high < 0 ? Negative(re) : re;
-    Extended y = im.high < 0 ? Negative(im) : im;
+    Extended x = re.high < 0 ? -re : re;
+    Extended y = im.high < 0 ? -im : im;
     const bool isSteep = y.high > x.high;
     if (isSteep) {
         const Extended t = x;
@@ -47,16 +45,16 @@ Extended ExtendedArgument(Extended re, Extended im) {
         return {0, 0};
     const int k = static_cast<int>(y.high / x.high * table::logarithmSteps + 0.5);
     const Extended near = {k * (1.0 / table::logarithmSteps), 0};
-    const Extended u = Difference(y, near * x) / (x + near * y); // below 1 / 64
+    const Extended u = (y - near * x) / (x + near * y); // below 1 / 64
     const double w = u.high * u.high;
     const double series =
         u.high * w * (-1.0 / 3 + w * (1.0 / 5 + w * (-1.0 / 7 + w * (1.0 / 9 - w * (1.0 / 11)))));
     Extended angle = table::arcTangents[k] + Extended{u.high, u.low + series};
     if (isSteep)
-        angle = Difference(table::extendedHalfPi, angle);
+        angle = table::extendedHalfPi - angle;
     if (re.high < 0)
-        angle = Difference(table::extendedPi, angle);
-    return im.high < 0 ? Negative(angle) : angle;
+        angle = table::extendedPi - angle;
+    return im.high < 0 ? -angle : angle;
 }
 
 Complex RootOfUpperHalf(Complex z) {
@@ -73,10 +71,9 @@ Complex RootOfUpperHalf(Complex z) {
 
 ExtendedComplex ExtendedRoot(ExtendedComplex z) { // one step of Newton's
     const Complex root = RootOfUpperHalf({z.re.high, z.im.high});
-    const Extended square =
-        Difference(ExactProduct(root.re, root.re), ExactProduct(root.im, root.im));
-    const Complex rest = {Difference(z.re, square).high,
-                          Difference(z.im, Twice(ExactProduct(root.re, root.im))).high};
+    const Extended square = ExactProduct(root.re, root.re) - ExactProduct(root.im, root.im);
+    const Complex rest = {(z.re - square).high,
+                          (z.im - Twice(ExactProduct(root.re, root.im))).high};
     const Complex step = rest / (root * 2);
     return {ExactSum(root.re, step.re), ExactSum(root.im, step.im)};
 }
@@ -85,17 +82,15 @@ DebyeExponent ExponentOfDebye(double order, Complex z) {
     // order^2 + z^2 = x^2 - (y + order) (y - order) + 2 i x y
     const Extended squareX = ExactProduct(z.re, z.re);
     const Extended crossed = ExactSum(z.im, order) * ExactSum(z.im, -order);
-    const ExtendedComplex s =
-        ExtendedRoot({Difference(squareX, crossed), Twice(ExactProduct(z.re, z.im))});
+    const ExtendedComplex s = ExtendedRoot({squareX - crossed, Twice(ExactProduct(z.re, z.im))});
     const Extended v = {order, 0};
     const Extended x = {z.re, 0};
     const Extended y = {z.im, 0};
     const ExtendedComplex a = {v + s.re, s.im};
     const Extended logarithm =
         LogOfQuotient(a.re * a.re + a.im * a.im, squareX + ExactProduct(z.im, z.im));
-    const Extended angle = ExtendedArgument(a.re * x + a.im * y, Difference(a.im * x, a.re * y));
-    return {{s.re.high, s.im.high},
-            {Difference(s.re, v * Half(logarithm)), Difference(s.im, v * angle)}};
+    const Extended angle = ExtendedArgument(a.re * x + a.im * y, a.im * x - a.re * y);
+    return {{s.re.high, s.im.high}, {s.re - v * Half(logarithm), s.im - v * angle}};
 }
 
 Complex Value(const Exponential &term, const ExtendedComplex &scale) {

@@ -40,18 +40,15 @@ Complex Inverse(Complex z) {
     const double scale = 1 / (z.re * z.re + z.im * z.im);
     return {z.re * scale, -z.im * scale};
 }
-ExtendedComplex Negative(ExtendedComplex e) {
-    return {{-e.re.high, -e.re.low}, {-e.im.high, -e.im.low}};
-}
+ExtendedComplex Negative(ExtendedComplex e) { return {-e.re, -e.im}; }
 Complex Difference(const ExtendedComplex &a, const ExtendedComplex &b) {
-    const ExtendedComplex less = Negative(b);
-    return {(a.re + less.re).high, (a.im + less.im).high};
+    return {(a.re - b.re).high, (a.im - b.im).high};
 }
 Complex Exp(Complex z) { return Value({kOne, Plain(z)}, Plain({0, 0})); }
 Complex TurnByPi(double turns) { return {CosPi(turns), SinPi(turns)}; } // exp(i pi turns)
 Exponential Conjugate(const Exponential &term) {
     const Extended im = term.exponent.im;
-    return {Conjugate(term.factor), {term.exponent.re, {-im.high, -im.low}}};
+    return {Conjugate(term.factor), {term.exponent.re, -im}};
 }
 
 // Below, z lies in the first quadrant; for K as AxisI asks for it a little beyond.

@@ -29,9 +29,9 @@ POINTS = [
     (30, -200 + 500j),
     # Debye's expansion, on both sides of the Stokes line, inside and outside of the turning points
     (10.1, 1e-6 + 1e-6j), (40, 3 - 2j), (80, 130 + 10j), (200, 90 - 300j), (-350.5, 20 + 80j),
-    (1000, 700 + 100j), (1000, 100 - 900j), (-999.5, 980 + 300j), (300.25, 700 + 7j),
+    (1000, 700 + 100j), (700, 60 - 640j), (-999.5, 980 + 90j), (300.25, 700 + 7j),
     # the turning region
-    (30, 30 + 0.5j), (50.5, 49 + 0j), (-75.3, 70 - 2j), (100, -104 + 3j), (220, 5 + 218j),
+    (30, 30 + 0.5j), (50.5, 49 + 0j), (-75.3, 70 - 2j), (100, -104 + 3j), (120, 5 + 118j),
     (1000, 1000 + 0j), (-1000.5, 990 + 12j), (800, -810 + 1j), (23.98, 51 + 0.01j),
     (39.2, -60 + 2.5j),
     # the negative axis
@@ -66,7 +66,10 @@ def functions(order, z):
     i, k = mpmath.besseli(order, z), mpmath.besselk(order, z)
     yield "BesselI", i, mpmath.exp(-abs(z.real)), modulus_of(i, k)
     yield "BesselK", k, mpmath.exp(z), modulus_of(i, k)
-    yield "BesselH1", j + 1j * y, 1 / turn, modulus
+    h1 = j + 1j * y
+    if z.imag > 100:  # cancels
+        h1 = -2j / mp.pi * mpmath.expjpi(-order / 2) * mpmath.besselk(order, -1j * z)
+    yield "BesselH1", h1, 1 / turn, modulus
     yield "BesselH2", j - 1j * y, turn, modulus
 
 
@@ -99,7 +102,7 @@ def rows(order, z, found, tolerance):
 
 for order, z in POINTS:
     upper = mpc(z.real, abs(z.imag))
-    mp.dps = 60 + int(abs(z.imag))
+    mp.dps = 60 + min(100, int(abs(z.imag)))
     rows(order, z, functions(mpf(order), upper), 30 + max(abs(order), abs(z)))
 mp.dps = 60
 for z in ARGUMENTS:
