@@ -4,12 +4,12 @@
 /* Bessel functions of real order and complex argument, and Airy functions of complex argument. The
    order is any real number. Where a function has a cut, it is the negative real axis, and the sign
    of a zero imaginary part chooses the side. On the positive real axis J, Y, I, K and the Airy
-   functions have the imaginary part 0, and on the negative one so do the unscaled Airy functions.
-   What underflows is 0. The numbers of formulas are those of M. Abramowitz and I. A. Stegun,
-   Handbook of mathematical functions, 1964; the methods, region by region, follow D. E. Amos,
-   Algorithm 644, ACM Transactions on Mathematical Software 12, 1986, but for the turning region
-   |z| near |order|, which recurrence in the order from Debye's expansions bridges.
-   docs/accuracy/special_complex.md has the measured errors. */
+   functions are real to the bit, and on the negative one so are the unscaled Airy functions. What
+   underflows is 0. The numbers of formulas are those of M. Abramowitz and I. A. Stegun, Handbook of
+   mathematical functions, 1964; the methods, region by region, follow D. E. Amos, Algorithm 644,
+   ACM Transactions on Mathematical Software 12, 1986, but for the turning region |z| near |order|,
+   which recurrence in the order from Debye's expansions bridges. docs/accuracy/special_complex.md
+   has the measured errors. */
 
 #include "qx/types.h"
 

@@ -28,8 +28,8 @@ enum class BesselKind { J, Y, I, K, H1, H2 };
 // exchanges H1 and H2:
 //   J = exp(i pi order / 2) I(w), H1 = -(2 i / pi) exp(-i pi order / 2) K(w), H2 = 2 J - H1,
 //   Y = i (J - H1); I and K for Re z < 0 by continuation from -z; orders below 0 by reflection.
-// No combination cancels beyond the modulus of the oscillating pair. On the positive real axis
-// what is real there has the imaginary part 0.
+// No combination cancels beyond the modulus of the oscillating pair. What is real on the
+// positive real axis is real to the bit.
 ComplexValue ComplexBessel(BesselKind kind, double order, CDB z, bool isScaled);
 
 enum class AiryKind { Ai, AiDerivative, Bi, BiDerivative };

@@ -11,7 +11,7 @@ typedef ErrorCode (*Airy)(const ::CDB *, int32_t, ::CDB *);
 // Orders and arguments that reach each method and each quadrant as the size grows.
 Recipe OfOrder(const char *name, Bessel function) {
     return {name, [function](Call &c) {
-                const double x = c.n;
+                const double x = 1 + c.n % 23;
                 const struct {
                     double order;
                     ::CDB z;
@@ -34,7 +34,7 @@ Recipe OfOrder(const char *name, Bessel function) {
 
 Recipe OfArgument(const char *name, Airy function) {
     return {name, [function](Call &c) {
-                const double x = c.n;
+                const double x = 1 + c.n % 23;
                 const ::CDB points[] = {{0.03 * x, 0.2},     {-0.2 * x, 0.1},  {0.4 * x, -0.3 * x},
                                         {0.0, 0.7 * x},      {-0.9 * x, 0.0},  {-0.9 * x, -0.0},
                                         {2.5 + 0.01 * x, 0}, {-12.0, 6.0 + x}, {14.0, -x}};
