@@ -16,8 +16,8 @@
 QX_BEGIN_DECLS
 
 /** Bessel function J of real order, a solution of z^2 w'' + z w' + (z^2 - order^2) w = 0 (9.1).
-    scaled other than 0 multiplies by exp(-|Im z|). With |z| and |order| beyond about 1.3e5 a call
-    takes time in proportion to their cube root where they are close to each other, 0.2 ms at most.
+    scaled other than 0 multiplies by exp(-|Im z|). Where |z| is near |order| a call takes time in
+    proportion to their cube root, here and below: 0.1 ms at 2^31.
     Codes: ErrBesselStatusOne (order or z is NaN or infinite, or z is 0 and the order is negative
     and no integer), ErrBesselStatusFour (|z| or |order| is above 2^31: no digit can be relied on),
     ErrOverflow (the result exceeds the range), WarnLowAccuracy (|z| or |order| is above 4.7e7, so
