@@ -1,0 +1,173 @@
+#ifndef QX_FIT_BOUNDS_H
+#define QX_FIT_BOUNDS_H
+
+/* How far the coefficients, the curve and the next observations of a fit can be trusted. Given are
+   the samples, as the fit had them, and its coefficients. With J the derivatives of the model by
+   the p coefficients at each x (row j), W the absolute weights, n the number of weights other than
+   0 and s^2 = (sum of |w| (y - f)^2) / (n - p), the bounds at a confidence, 0 < confidence < 1, are
+
+       coefficient i:   c[i] -+ t s sqrt((J' W J)^-1[i, i])
+       confidence:      f(x) -+ t s sqrt(j' (J' W J)^-1 j)
+       prediction:      f(x) -+ t s sqrt(j' (J' W J)^-1 j + 1)
+
+   where t is the (1 + confidence) / 2 quantile of Student's distribution with n - p degrees of
+   freedom. Confidence bounds are for the curve itself at one x (not for all x at once), prediction
+   bounds for one more observation of weight 1 there. Weights are inverse variances up to a factor;
+   empty, they are all 1. Where all weights are 0 no sample counts.
+
+   A sample of weight 0 has bounds all the same: to have bounds at other x, append these with any y
+   and the weight 0.
+
+   The bounds hold exactly for models that are linear in the coefficients with normal errors; for
+   the others the model is linearised at the coefficients, which are used as they are: coefficients
+   that do not minimise the squares give wider bounds, since s^2 is theirs. J is factored (QR, in
+   blocks of rows), never J' W J. J is of full rank where no weighted column depends on those before
+   it within (16 + p) times 2.2e-16. The bounds lose the digits that J's condition with columns of
+   equal length takes: centre the x of polynomials. Where residuals are of the size of the rounding
+   errors of y, so are the widths. Bounds beyond the largest number are infinite; confidences below
+   1e-140 give the width 0.
+
+   A failure empties the outputs.
+
+   Sources: N. R. Draper, H. Smith, Applied Regression Analysis, 3rd edition, 1998; for the models
+   not linear in their coefficients D. M. Bates, D. G. Watts, Nonlinear Regression Analysis and Its
+   Applications, 1988. */
+
+#include "qx/types.h"
+
+QX_BEGIN_DECLS
+
+/** Bounds of the line y = slope x + intercept; coefficients: slope, intercept (LinFit_head).
+    lowerCoefficients and upperCoefficients have a value per coefficient, lowerCurve and upperCurve
+    the confidence bounds at each sample.
+    Codes: ErrEmptyInput (x, y or the coefficients are empty), ErrSizeMismatch (x, y and weights
+    differ in length, or there are not two coefficients), ErrFewerThanThree (less than three
+    samples), ErrNonFiniteInput (an input is NaN or infinite, or later, a value, derivative or
+    weighted residual of the model overflows), ErrTooFewForParameters (not more weights other than 0
+    than coefficients), ErrProbabilityOutOfRange (confidence), ErrSingularMatrix (J without full
+    rank: all x alike), ErrOutOfMemory (no memory, or an array cannot be resized). */
+QX_API ErrorCode ConfBndLinear_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D w,
+                                    QX_IN DBL1D coefficients, double confidence,
+                                    QX_OUT DBL1D lowerCoefficients, QX_OUT DBL1D upperCoefficients,
+                                    QX_OUT DBL1D lowerCurve, QX_OUT DBL1D upperCurve);
+/** As ConfBndLinear_head, with the bounds of prediction, and none of the coefficients. */
+QX_API ErrorCode PredBndLinear_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D w,
+                                    QX_IN DBL1D coefficients, double confidence,
+                                    QX_OUT DBL1D lowerCurve, QX_OUT DBL1D upperCurve);
+
+/** Bounds of y = a exp(b x); coefficients: a, b (ExpFit80_head). lowerCoefficients and
+    upperCoefficients have a value per coefficient, lowerCurve and upperCurve the confidence bounds
+    at each sample.
+    Codes: ErrEmptyInput (x, y or the coefficients are empty), ErrSizeMismatch (x, y and weights
+    differ in length, or there are not two coefficients), ErrFewerThanThree (less than three
+    samples), ErrNonFiniteInput (an input is NaN or infinite, or later, a value, derivative or
+    weighted residual of the model overflows), ErrTooFewForParameters (not more weights other than 0
+    than coefficients), ErrProbabilityOutOfRange (confidence), ErrSingularMatrix (J without full
+    rank: a is 0, or all x alike), ErrOutOfMemory (no memory, or an array cannot be resized). */
+QX_API ErrorCode ConfBndExp_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D w,
+                                 QX_IN DBL1D coefficients, double confidence,
+                                 QX_OUT DBL1D lowerCoefficients, QX_OUT DBL1D upperCoefficients,
+                                 QX_OUT DBL1D lowerCurve, QX_OUT DBL1D upperCurve);
+/** As ConfBndExp_head, with the bounds of prediction, and none of the coefficients. */
+QX_API ErrorCode PredBndExp_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D w,
+                                 QX_IN DBL1D coefficients, double confidence,
+                                 QX_OUT DBL1D lowerCurve, QX_OUT DBL1D upperCurve);
+
+/** Bounds of y = a x^b, x above 0; coefficients: a, b (PowerFit_head). lowerCoefficients and
+    upperCoefficients have a value per coefficient, lowerCurve and upperCurve the confidence bounds
+    at each sample.
+    Codes: ErrEmptyInput (x, y or the coefficients are empty), ErrSizeMismatch (x, y and weights
+    differ in length, or there are not two coefficients), ErrFewerThanThree (less than three
+    samples), ErrNonFiniteInput (an input is NaN or infinite, or later, a value, derivative or
+    weighted residual of the model overflows), ErrNotStrictlyPositive (an x is not above 0),
+    ErrTooFewForParameters (not more weights other than 0 than coefficients),
+    ErrProbabilityOutOfRange (confidence), ErrSingularMatrix (J without full rank: a is 0, or all x
+    alike), ErrOutOfMemory (no memory, or an array cannot be resized). */
+QX_API ErrorCode ConfBndPower_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D w,
+                                   QX_IN DBL1D coefficients, double confidence,
+                                   QX_OUT DBL1D lowerCoefficients, QX_OUT DBL1D upperCoefficients,
+                                   QX_OUT DBL1D lowerCurve, QX_OUT DBL1D upperCurve);
+/** As ConfBndPower_head, with the bounds of prediction, and none of the coefficients. */
+QX_API ErrorCode PredBndPower_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D w,
+                                   QX_IN DBL1D coefficients, double confidence,
+                                   QX_OUT DBL1D lowerCurve, QX_OUT DBL1D upperCurve);
+
+/** Bounds of y = a log(b x) to the given base; coefficients: a, b (LogFit_head). The base 2.71828,
+    these six digits, stands for e. lowerCoefficients and upperCoefficients have a value per
+    coefficient, lowerCurve and upperCurve the confidence bounds at each sample.
+    Codes: ErrEmptyInput (x, y or the coefficients are empty), ErrSizeMismatch (x, y and weights
+    differ in length, or there are not two coefficients), ErrFewerThanThree (less than three
+    samples), ErrNonFiniteInput (an input is NaN or infinite, or later, a value, derivative or
+    weighted residual of the model overflows), ErrNotStrictlyPositive (b x is not above 0 for all x,
+    or the base is not above 0, or is 1), ErrTooFewForParameters (not more weights other than 0 than
+    coefficients), ErrProbabilityOutOfRange (confidence), ErrSingularMatrix (J without full rank: a
+    is 0, or all x alike), ErrOutOfMemory (no memory, or an array cannot be resized). */
+QX_API ErrorCode ConfBndLog_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D w,
+                                 QX_IN DBL1D coefficients, double base, double confidence,
+                                 QX_OUT DBL1D lowerCoefficients, QX_OUT DBL1D upperCoefficients,
+                                 QX_OUT DBL1D lowerCurve, QX_OUT DBL1D upperCurve);
+/** As ConfBndLog_head, with the bounds of prediction, and none of the coefficients. */
+QX_API ErrorCode PredBndLog_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D w,
+                                 QX_IN DBL1D coefficients, double base, double confidence,
+                                 QX_OUT DBL1D lowerCurve, QX_OUT DBL1D upperCurve);
+
+/** Bounds of y = a exp(-((x - c) / s)^2 / 2); coefficients: a, c, s (GaussianPeakFit_head).
+    lowerCoefficients and upperCoefficients have a value per coefficient, lowerCurve and upperCurve
+    the confidence bounds at each sample.
+    Codes: ErrEmptyInput (x, y or the coefficients are empty), ErrSizeMismatch (x, y and weights
+    differ in length, or there are not three coefficients), ErrFewerThanThree (less than three
+    samples), ErrNonFiniteInput (an input is NaN or infinite, or later, a value, derivative or
+    weighted residual of the model overflows), ErrTooFewForParameters (not more weights other than 0
+    than coefficients), ErrProbabilityOutOfRange (confidence), ErrSingularMatrix (J without full
+    rank: a or s is 0, or the samples that count lie where the curve is 0), ErrOutOfMemory (no
+    memory, or an array cannot be resized). */
+QX_API ErrorCode ConfBndGauss_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D w,
+                                   QX_IN DBL1D coefficients, double confidence,
+                                   QX_OUT DBL1D lowerCoefficients, QX_OUT DBL1D upperCoefficients,
+                                   QX_OUT DBL1D lowerCurve, QX_OUT DBL1D upperCurve);
+/** As ConfBndGauss_head, with the bounds of prediction, and none of the coefficients. */
+QX_API ErrorCode PredBndGauss_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D w,
+                                   QX_IN DBL1D coefficients, double confidence,
+                                   QX_OUT DBL1D lowerCurve, QX_OUT DBL1D upperCurve);
+
+/** Bounds of the polynomial sum of coefficients[j] x^j (PolyFit_head). As in the fit, at most the
+    first 26 coefficients are parameters; others are taken as given and have no width.
+    lowerCoefficients and upperCoefficients have a value per coefficient, lowerCurve and upperCurve
+    the confidence bounds at each sample.
+    Codes: ErrEmptyInput (x, y or the coefficients are empty), ErrSizeMismatch (x, y and weights
+    differ in length), ErrFewerThanThree (less than three samples), ErrNonFiniteInput (an input is
+    NaN or infinite, or later, a value, derivative or weighted residual of the model overflows),
+    ErrTooFewForParameters (not more weights other than 0 than coefficients),
+    ErrProbabilityOutOfRange (confidence), ErrSingularMatrix (J without full rank: less different x
+    than coefficients), ErrOutOfMemory (no memory, or an array cannot be resized). */
+QX_API ErrorCode ConfBndPoly_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D w,
+                                  QX_IN DBL1D coefficients, double confidence,
+                                  QX_OUT DBL1D lowerCoefficients, QX_OUT DBL1D upperCoefficients,
+                                  QX_OUT DBL1D lowerCurve, QX_OUT DBL1D upperCurve);
+/** As ConfBndPoly_head, with the bounds of prediction, and none of the coefficients. */
+QX_API ErrorCode PredBndPoly_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D w,
+                                  QX_IN DBL1D coefficients, double confidence,
+                                  QX_OUT DBL1D lowerCurve, QX_OUT DBL1D upperCurve);
+
+/** Bounds of y = H c for a matrix with one row per sample and one column per coefficient
+    (GenLSFit80_head); any number of samples above that of the columns will do. lowerCoefficients
+    and upperCoefficients have a value per coefficient, lowerCurve and upperCurve the confidence
+    bounds at each sample.
+    Codes: ErrEmptyInput (H, y or the coefficients are empty), ErrSizeMismatch (H, y and weights
+    differ in length, or the columns and the coefficients in number), ErrNonFiniteInput (an input is
+    NaN or infinite, or later, a value, derivative or weighted residual of the model overflows),
+    ErrTooFewForParameters (not more weights other than 0 than coefficients),
+    ErrProbabilityOutOfRange (confidence), ErrSingularMatrix (J without full rank: columns that
+    depend on each other), ErrOutOfMemory (no memory, or an array cannot be resized). */
+QX_API ErrorCode ConfBndGenLS_head(QX_IN DBL2D H, QX_IN DBL1D y, QX_IN DBL1D w,
+                                   QX_IN DBL1D coefficients, double confidence,
+                                   QX_OUT DBL1D lowerCoefficients, QX_OUT DBL1D upperCoefficients,
+                                   QX_OUT DBL1D lowerCurve, QX_OUT DBL1D upperCurve);
+/** As ConfBndGenLS_head, with the bounds of prediction, and none of the coefficients. */
+QX_API ErrorCode PredBndGenLS_head(QX_IN DBL2D H, QX_IN DBL1D y, QX_IN DBL1D w,
+                                   QX_IN DBL1D coefficients, double confidence,
+                                   QX_OUT DBL1D lowerCurve, QX_OUT DBL1D upperCurve);
+
+QX_END_DECLS
+
+#endif

@@ -1,0 +1,40 @@
+#ifndef QX_FIT_BOUNDS_INNER_H
+#define QX_FIT_BOUNDS_INNER_H
+
+#include "fit/model_rows.h"
+#include "qx/errors.h"
+
+namespace qx {
+
+// Confidence and prediction bounds of a fitted model, from its Jacobian at the coefficients.
+
+// The t that Student's distribution with `dof` degrees of freedom keeps within -t to t with the
+// probability `confidence`, 0 < confidence < 1; 0 for confidences below 1e-140.
+double TwoSidedT(double confidence, double dof);
+
+// Where a model is linearised. Its rows hold the derivatives of the model by its k parameters and
+// as the target the value of the model; w are the weights, of which `used` are not 0.
+struct FittedModel {
+    LinearModel linear;
+    const DBL *y;
+    int32_t used;
+};
+
+// The weights that count: all where w is null.
+int32_t CountUsed(const DBL *w, int32_t n);
+
+enum class BoundsOf { Curve, Observation };
+
+// lower and upper = f -+ t s sqrt(j' (J' W J)^-1 j [+ 1 for an observation]) at each sample, with
+// s^2 = sum of |w| (y - f)^2 over (used - k), and likewise halfWidths (k elements, or null) = t s
+// sqrt of the diagonal of (J' W J)^-1. From the triangle R of J without Q: j' (J' W J)^-1 j is the
+// square of R^-T j. Needs used > k.
+//
+// ErrNonFiniteInput (a derivative, value or weighted residual of the model), ErrSingularMatrix (a
+// column of the weighted J depends on those before it within some eps), ErrOutOfMemory.
+ErrorCode BoundsOfFit(const FittedModel &model, double confidence, BoundsOf what, DBL *halfWidths,
+                      DBL *lower, DBL *upper);
+
+} // namespace qx
+
+#endif

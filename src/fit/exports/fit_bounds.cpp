@@ -1,0 +1,380 @@
+#include "qx/fit_bounds.h"
+
+#include "fit/bounds.h"
+#include "fit/exports/fit_arguments.h"
+#include "fit/logarithm.h"
+#include "frame/constants.h"
+#include "linalg/matrix.h"
+
+#include <algorithm>
+#include <cmath>
+
+namespace qx {
+namespace {
+
+// The models: how many coefficients each has (0: any number), the codes of its own, and its value
+// and derivatives at a sample.
+
+struct Line {
+    static constexpr int32_t count = 2;
+    static ErrorCode check(In<DBL1D>, const DBL *) { return 0; }
+    static bool isSingular(const DBL *) { return false; }
+    static double evaluate(double x, const DBL *c, DBL *d) {
+        d[0] = x;
+        d[1] = 1.0;
+        return c[0] * x + c[1];
+    }
+};
+
+struct Exponential {
+    static constexpr int32_t count = 2;
+    static ErrorCode check(In<DBL1D>, const DBL *) { return 0; }
+    static bool isSingular(const DBL *c) { return c[0] == 0.0; }
+    static double evaluate(double x, const DBL *c, DBL *d) {
+        d[0] = std::exp(c[1] * x);
+        d[1] = c[0] * d[0] * x;
+        return c[0] * d[0];
+    }
+};
+
+struct Power {
+    static constexpr int32_t count = 2;
+    static ErrorCode check(In<DBL1D> x, const DBL *) {
+        return SameSign(x.data(), x.size()) == 1.0 ? 0 : ErrNotStrictlyPositive;
+    }
+    static bool isSingular(const DBL *c) { return c[0] == 0.0; }
+    static double evaluate(double x, const DBL *c, DBL *d) {
+        d[0] = std::pow(x, c[1]);
+        d[1] = c[0] * d[0] * std::log(x);
+        return c[0] * d[0];
+    }
+};
+
+struct Gaussian {
+    static constexpr int32_t count = 3;
+    static ErrorCode check(In<DBL1D>, const DBL *) { return 0; }
+    static bool isSingular(const DBL *c) { return c[0] == 0.0 || c[2] == 0.0; }
+    static double evaluate(double x, const DBL *c, DBL *d) {
+        const double z = (x - c[1]) / c[2];
+        d[0] = std::exp(-0.5 * (z * z));
+        d[1] = c[0] * d[0] * z / c[2];
+        d[2] = d[1] * z;
+        return c[0] * d[0];
+    }
+};
+
+class Logarithm {
+public:
+    static constexpr int32_t count = 2;
+    explicit Logarithm(double base) : base_(base), logarithm_(base) {}
+    ErrorCode check(In<DBL1D> x, const DBL *c) const {
+        const double sign = SameSign(x.data(), x.size());
+        const bool isPositive = (sign > 0.0 && c[1] > 0.0) || (sign < 0.0 && c[1] < 0.0);
+        return isPositive && base_ > 0.0 && base_ != 1.0 ? 0 : ErrNotStrictlyPositive;
+    }
+    static bool isSingular(const DBL *c) { return c[0] == 0.0; }
+    double evaluate(double x, const DBL *c, DBL *d) const {
+        d[0] = logarithm_.log(c[1] * x);
+        d[1] = c[0] * logarithm_.log(kE) / c[1];
+        return c[0] * d[0];
+    }
+
+private:
+    double base_;
+    LogBase logarithm_;
+};
+
+// Where the bounds go. The lengths of the coefficients' arrays are those of the fit.
+struct ConfidenceOutputs {
+    Out<DBL1D> &lowerCoefficients, &upperCoefficients, &lower, &upper;
+};
+struct PredictionOutputs {
+    Out<DBL1D> &lower, &upper;
+};
+
+Outcome Sized(const PredictionOutputs &out, int32_t n, int32_t) {
+    for (Out<DBL1D> *const array : {&out.lower, &out.upper})
+        if (const Outcome bad = array->resize(n))
+            return bad;
+    return 0;
+}
+Outcome Sized(const ConfidenceOutputs &out, int32_t n, int32_t coefficients) {
+    for (Out<DBL1D> *const array : {&out.lowerCoefficients, &out.upperCoefficients})
+        if (const Outcome bad = array->resize(coefficients))
+            return bad;
+    return Sized(PredictionOutputs{out.lower, out.upper}, n, coefficients);
+}
+
+Outcome Bounds(const FittedModel &model, In<DBL1D>, double confidence,
+               const PredictionOutputs &out) {
+    if (const Outcome bad = Sized(out, model.linear.n, 0))
+        return bad;
+    return BoundsOfFit(model, confidence, BoundsOf::Observation, nullptr, out.lower.data(),
+                       out.upper.data());
+}
+// Coefficients beyond the parameters of the model are given and have no width.
+Outcome Bounds(const FittedModel &model, In<DBL1D> coefficients, double confidence,
+               const ConfidenceOutputs &out) {
+    const int32_t count = coefficients.size();
+    if (const Outcome bad = Sized(out, model.linear.n, count))
+        return bad;
+    DBL *const low = out.lowerCoefficients.data(), *const high = out.upperCoefficients.data();
+    std::fill(high, high + count, 0.0);
+    if (const ErrorCode failed = BoundsOfFit(model, confidence, BoundsOf::Curve, high,
+                                             out.lower.data(), out.upper.data()))
+        return failed;
+    for (int32_t i = 0; i < count; ++i) {
+        const double c = coefficients.data()[i], half = high[i];
+        low[i] = c - half;
+        high[i] = c + half;
+    }
+    return 0;
+}
+
+struct Samples {
+    In<DBL1D> y, w, coefficients;
+    bool areFinite() const {
+        return CheckFinite(y.data(), y.size()) == 0 &&
+               (w.isEmpty() || CheckFinite(w.data(), w.size()) == 0) &&
+               CheckFinite(coefficients.data(), coefficients.size()) == 0;
+    }
+};
+
+// The checks that all share, behind those of the model's own.
+ErrorCode CheckDegrees(int32_t used, int32_t k, double confidence) {
+    return FirstFailed({{used <= k, ErrTooFewForParameters},
+                        {!(confidence > 0.0 && confidence < 1.0), ErrProbabilityOutOfRange}});
+}
+
+ErrorCode CheckAbscissae(In<DBL1D> x, const Samples &samples, int32_t count) {
+    const int32_t n = samples.y.size();
+    if (x.isEmpty() || samples.y.isEmpty() || samples.coefficients.isEmpty())
+        return ErrEmptyInput;
+    return FirstFailed({{x.size() != n || !WeightsFit(samples.w, n) ||
+                             (count > 0 && samples.coefficients.size() != count),
+                         ErrSizeMismatch},
+                        {n < 3, ErrFewerThanThree}});
+}
+
+template <class Model, class Outputs>
+Outcome CurveBounds(const Model &curve, In<DBL1D> x, const Samples &samples, double confidence,
+                    const Outputs &out) {
+    constexpr int32_t k = Model::count;
+    if (const ErrorCode failed = CheckAbscissae(x, samples, k))
+        return failed;
+    if (CheckFinite(x.data(), x.size()) != 0 || !samples.areFinite())
+        return ErrNonFiniteInput;
+    const DBL *const c = samples.coefficients.data();
+    if (const ErrorCode failed = curve.check(x, c))
+        return failed;
+    const int32_t n = x.size(), used = CountUsed(WeightsOf(samples.w), n);
+    if (const ErrorCode failed = CheckDegrees(used, k, confidence))
+        return failed;
+    if (curve.isSingular(c))
+        return ErrSingularMatrix;
+    const auto writeRows = [&](const RowBlock &block) {
+        for (int32_t i = 0; i < block.count; ++i) {
+            DBL d[k];
+            block.column(k)[i] = curve.evaluate(x.data()[block.first + i], c, d);
+            for (int32_t j = 0; j < k; ++j)
+                block.column(j)[i] = d[j];
+        }
+    };
+    return Bounds({{writeRows, n, k, WeightsOf(samples.w)}, samples.y.data(), used},
+                  samples.coefficients, confidence, out);
+}
+
+// The powers that a polynomial fit determines; terms beyond them are given.
+template <class Outputs>
+Outcome PolynomialBounds(In<DBL1D> x, const Samples &samples, double confidence,
+                         const Outputs &out) {
+    constexpr int32_t mostFitted = 26;
+    if (const ErrorCode failed = CheckAbscissae(x, samples, 0))
+        return failed;
+    if (CheckFinite(x.data(), x.size()) != 0 || !samples.areFinite())
+        return ErrNonFiniteInput;
+    const DBL *const c = samples.coefficients.data();
+    const int32_t terms = samples.coefficients.size(), k = std::min(terms, mostFitted);
+    const int32_t n = x.size(), used = CountUsed(WeightsOf(samples.w), n);
+    if (const ErrorCode failed = CheckDegrees(used, k, confidence))
+        return failed;
+    const auto writeRows = [&](const RowBlock &block) {
+        const DBL *const from = x.data() + block.first;
+        DBL *const value = block.column(k);
+        std::fill(value, value + block.count, c[terms - 1]);
+        for (int32_t j = terms - 2; j >= 0; --j)
+            for (int32_t i = 0; i < block.count; ++i)
+                value[i] = value[i] * from[i] + c[j];
+        std::fill(block.start, block.start + block.count, 1.0);
+        for (int32_t j = 1; j < k; ++j)
+            for (int32_t i = 0; i < block.count; ++i)
+                block.column(j)[i] = block.column(j - 1)[i] * from[i];
+    };
+    return Bounds({{writeRows, n, k, WeightsOf(samples.w)}, samples.y.data(), used},
+                  samples.coefficients, confidence, out);
+}
+
+template <class Outputs>
+Outcome MatrixBounds(In<DBL2D> h, const Samples &samples, double confidence, const Outputs &out) {
+    if (h.isEmpty() || samples.y.isEmpty() || samples.coefficients.isEmpty())
+        return ErrEmptyInput;
+    const int32_t n = h.rows(), k = h.cols();
+    if (samples.y.size() != n || !WeightsFit(samples.w, n) || samples.coefficients.size() != k)
+        return ErrSizeMismatch;
+    if (CheckFinite(h.data(), int64_t{n} * k) != 0 || !samples.areFinite())
+        return ErrNonFiniteInput;
+    const int32_t used = CountUsed(WeightsOf(samples.w), n);
+    if (const ErrorCode failed = CheckDegrees(used, k, confidence))
+        return failed;
+    const DBL *const c = samples.coefficients.data();
+    const auto writeRows = [&](const RowBlock &block) {
+        TransposeInto(h.data() + std::ptrdiff_t{block.first} * k, block.count, k, block.start);
+        DBL *const value = block.column(k);
+        std::fill(value, value + block.count, 0.0);
+        for (int32_t j = 0; j < k; ++j)
+            for (int32_t i = 0; i < block.count; ++i)
+                value[i] += block.column(j)[i] * c[j];
+    };
+    return Bounds({{writeRows, n, k, WeightsOf(samples.w)}, samples.y.data(), used},
+                  samples.coefficients, confidence, out);
+}
+
+// The frames.
+
+template <class Model>
+Outcome ConfOfCurve(In<DBL1D> x, In<DBL1D> y, In<DBL1D> w, In<DBL1D> c, double confidence,
+                    Out<DBL1D> lowerC, Out<DBL1D> upperC, Out<DBL1D> lower, Out<DBL1D> upper) {
+    return CurveBounds(Model(), x, {y, w, c}, confidence,
+                       ConfidenceOutputs{lowerC, upperC, lower, upper});
+}
+template <class Model>
+Outcome PredOfCurve(In<DBL1D> x, In<DBL1D> y, In<DBL1D> w, In<DBL1D> c, double confidence,
+                    Out<DBL1D> lower, Out<DBL1D> upper) {
+    return CurveBounds(Model(), x, {y, w, c}, confidence, PredictionOutputs{lower, upper});
+}
+
+// A base of NaN is out of range, an infinite one is not finite.
+template <class Outputs>
+Outcome LogarithmBounds(In<DBL1D> x, const Samples &samples, double base, double confidence,
+                        const Outputs &out) {
+    if (std::isinf(base))
+        if (const ErrorCode failed = CheckAbscissae(x, samples, Logarithm::count))
+            return failed;
+    return std::isinf(base) ? Outcome(ErrNonFiniteInput)
+                            : CurveBounds(Logarithm(base), x, samples, confidence, out);
+}
+Outcome ConfOfLog(In<DBL1D> x, In<DBL1D> y, In<DBL1D> w, In<DBL1D> c, double base,
+                  double confidence, Out<DBL1D> lowerC, Out<DBL1D> upperC, Out<DBL1D> lower,
+                  Out<DBL1D> upper) {
+    return LogarithmBounds(x, {y, w, c}, base, confidence,
+                           ConfidenceOutputs{lowerC, upperC, lower, upper});
+}
+Outcome PredOfLog(In<DBL1D> x, In<DBL1D> y, In<DBL1D> w, In<DBL1D> c, double base,
+                  double confidence, Out<DBL1D> lower, Out<DBL1D> upper) {
+    return LogarithmBounds(x, {y, w, c}, base, confidence, PredictionOutputs{lower, upper});
+}
+
+Outcome ConfOfPolynomial(In<DBL1D> x, In<DBL1D> y, In<DBL1D> w, In<DBL1D> c, double confidence,
+                         Out<DBL1D> lowerC, Out<DBL1D> upperC, Out<DBL1D> lower, Out<DBL1D> upper) {
+    return PolynomialBounds(x, {y, w, c}, confidence,
+                            ConfidenceOutputs{lowerC, upperC, lower, upper});
+}
+Outcome PredOfPolynomial(In<DBL1D> x, In<DBL1D> y, In<DBL1D> w, In<DBL1D> c, double confidence,
+                         Out<DBL1D> lower, Out<DBL1D> upper) {
+    return PolynomialBounds(x, {y, w, c}, confidence, PredictionOutputs{lower, upper});
+}
+Outcome ConfOfMatrix(In<DBL2D> h, In<DBL1D> y, In<DBL1D> w, In<DBL1D> c, double confidence,
+                     Out<DBL1D> lowerC, Out<DBL1D> upperC, Out<DBL1D> lower, Out<DBL1D> upper) {
+    return MatrixBounds(h, {y, w, c}, confidence, ConfidenceOutputs{lowerC, upperC, lower, upper});
+}
+Outcome PredOfMatrix(In<DBL2D> h, In<DBL1D> y, In<DBL1D> w, In<DBL1D> c, double confidence,
+                     Out<DBL1D> lower, Out<DBL1D> upper) {
+    return MatrixBounds(h, {y, w, c}, confidence, PredictionOutputs{lower, upper});
+}
+
+} // namespace
+} // namespace qx
+
+using qx::Returned;
+
+ErrorCode ConfBndLinear_head(DBL1D x, DBL1D y, DBL1D w, DBL1D coefficients, double confidence,
+                             DBL1D lowerCoefficients, DBL1D upperCoefficients, DBL1D lowerCurve,
+                             DBL1D upperCurve) {
+    return Returned(qx::ConfOfCurve<qx::Line>, x, y, w, coefficients, confidence, lowerCoefficients,
+                    upperCoefficients, lowerCurve, upperCurve);
+}
+ErrorCode PredBndLinear_head(DBL1D x, DBL1D y, DBL1D w, DBL1D coefficients, double confidence,
+                             DBL1D lowerCurve, DBL1D upperCurve) {
+    return Returned(qx::PredOfCurve<qx::Line>, x, y, w, coefficients, confidence, lowerCurve,
+                    upperCurve);
+}
+
+ErrorCode ConfBndExp_head(DBL1D x, DBL1D y, DBL1D w, DBL1D coefficients, double confidence,
+                          DBL1D lowerCoefficients, DBL1D upperCoefficients, DBL1D lowerCurve,
+                          DBL1D upperCurve) {
+    return Returned(qx::ConfOfCurve<qx::Exponential>, x, y, w, coefficients, confidence,
+                    lowerCoefficients, upperCoefficients, lowerCurve, upperCurve);
+}
+ErrorCode PredBndExp_head(DBL1D x, DBL1D y, DBL1D w, DBL1D coefficients, double confidence,
+                          DBL1D lowerCurve, DBL1D upperCurve) {
+    return Returned(qx::PredOfCurve<qx::Exponential>, x, y, w, coefficients, confidence, lowerCurve,
+                    upperCurve);
+}
+
+ErrorCode ConfBndPower_head(DBL1D x, DBL1D y, DBL1D w, DBL1D coefficients, double confidence,
+                            DBL1D lowerCoefficients, DBL1D upperCoefficients, DBL1D lowerCurve,
+                            DBL1D upperCurve) {
+    return Returned(qx::ConfOfCurve<qx::Power>, x, y, w, coefficients, confidence,
+                    lowerCoefficients, upperCoefficients, lowerCurve, upperCurve);
+}
+ErrorCode PredBndPower_head(DBL1D x, DBL1D y, DBL1D w, DBL1D coefficients, double confidence,
+                            DBL1D lowerCurve, DBL1D upperCurve) {
+    return Returned(qx::PredOfCurve<qx::Power>, x, y, w, coefficients, confidence, lowerCurve,
+                    upperCurve);
+}
+
+ErrorCode ConfBndLog_head(DBL1D x, DBL1D y, DBL1D w, DBL1D coefficients, double base,
+                          double confidence, DBL1D lowerCoefficients, DBL1D upperCoefficients,
+                          DBL1D lowerCurve, DBL1D upperCurve) {
+    return Returned(qx::ConfOfLog, x, y, w, coefficients, base, confidence, lowerCoefficients,
+                    upperCoefficients, lowerCurve, upperCurve);
+}
+ErrorCode PredBndLog_head(DBL1D x, DBL1D y, DBL1D w, DBL1D coefficients, double base,
+                          double confidence, DBL1D lowerCurve, DBL1D upperCurve) {
+    return Returned(qx::PredOfLog, x, y, w, coefficients, base, confidence, lowerCurve, upperCurve);
+}
+
+ErrorCode ConfBndGauss_head(DBL1D x, DBL1D y, DBL1D w, DBL1D coefficients, double confidence,
+                            DBL1D lowerCoefficients, DBL1D upperCoefficients, DBL1D lowerCurve,
+                            DBL1D upperCurve) {
+    return Returned(qx::ConfOfCurve<qx::Gaussian>, x, y, w, coefficients, confidence,
+                    lowerCoefficients, upperCoefficients, lowerCurve, upperCurve);
+}
+ErrorCode PredBndGauss_head(DBL1D x, DBL1D y, DBL1D w, DBL1D coefficients, double confidence,
+                            DBL1D lowerCurve, DBL1D upperCurve) {
+    return Returned(qx::PredOfCurve<qx::Gaussian>, x, y, w, coefficients, confidence, lowerCurve,
+                    upperCurve);
+}
+
+ErrorCode ConfBndPoly_head(DBL1D x, DBL1D y, DBL1D w, DBL1D coefficients, double confidence,
+                           DBL1D lowerCoefficients, DBL1D upperCoefficients, DBL1D lowerCurve,
+                           DBL1D upperCurve) {
+    return Returned(qx::ConfOfPolynomial, x, y, w, coefficients, confidence, lowerCoefficients,
+                    upperCoefficients, lowerCurve, upperCurve);
+}
+ErrorCode PredBndPoly_head(DBL1D x, DBL1D y, DBL1D w, DBL1D coefficients, double confidence,
+                           DBL1D lowerCurve, DBL1D upperCurve) {
+    return Returned(qx::PredOfPolynomial, x, y, w, coefficients, confidence, lowerCurve,
+                    upperCurve);
+}
+
+ErrorCode ConfBndGenLS_head(DBL2D H, DBL1D y, DBL1D w, DBL1D coefficients, double confidence,
+                            DBL1D lowerCoefficients, DBL1D upperCoefficients, DBL1D lowerCurve,
+                            DBL1D upperCurve) {
+    return Returned(qx::ConfOfMatrix, H, y, w, coefficients, confidence, lowerCoefficients,
+                    upperCoefficients, lowerCurve, upperCurve);
+}
+ErrorCode PredBndGenLS_head(DBL2D H, DBL1D y, DBL1D w, DBL1D coefficients, double confidence,
+                            DBL1D lowerCurve, DBL1D upperCurve) {
+    return Returned(qx::PredOfMatrix, H, y, w, coefficients, confidence, lowerCurve, upperCurve);
+}
