@@ -1,0 +1,274 @@
+#include "fit/tests/least_squares.h"
+#include "qx/qx.h"
+#include "tests/support/recipe.h"
+
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <cmath>
+#include <numeric>
+
+namespace {
+
+using qx::test::DBLArray;
+using qx::test::DBLMatrix;
+using qx::test::infinity;
+using qx::test::Inverse;
+using qx::test::Long;
+using qx::test::nan;
+using qx::test::Noise;
+using qx::test::Rows;
+using qx::test::Samples;
+using qx::test::SolveNormal;
+
+typedef std::vector<std::vector<Long>> Square;
+
+struct Smoothed {
+    ErrorCode code;
+    Samples values, second, pieces;
+    double lambda, effective;
+};
+Smoothed Smooth(const Samples &x, const Samples &y, const Samples &d, int32_t method,
+                double parameter) {
+    const DBLArray values, second;
+    const DBLMatrix pieces;
+    Smoothed result = {};
+    result.code = CubicSplineFit_head(
+        DBLArray(x).handle(), DBLArray(y).handle(), DBLArray(d).handle(), method, parameter,
+        values.handle(), pieces.handle(), second.handle(), &result.lambda, &result.effective);
+    result.values = values.values();
+    result.second = second.values();
+    result.pieces.assign(pieces.data(), pieces.data() + pieces.rows() * pieces.cols());
+    return result;
+}
+
+struct Data {
+    Samples x, y, d;
+};
+Data Noisy(int n) {
+    Noise noise(static_cast<uint64_t>(n));
+    Data data;
+    double x = -3.0;
+    for (int i = 0; i < n; ++i) {
+        x += 0.1 + noise.positive();
+        data.x.push_back(x);
+        data.y.push_back(std::sin(12.0 * i / n) + 0.2 * noise.symmetric());
+        data.d.push_back(0.5 + noise.positive());
+    }
+    return data;
+}
+
+// The matrix from y to the values, dense: (D^-2 + lambda Q R^-1 Q')^-1 D^-2.
+Square Influence(const Data &data, Long lambda) {
+    const std::size_t n = data.x.size(), m = n - 2;
+    Square q(n, std::vector<Long>(m)), r(m, std::vector<Long>(m)), sum(n, std::vector<Long>(n));
+    for (std::size_t j = 0; j < m; ++j) {
+        const Long h = Long{data.x[j + 1]} - data.x[j], next = Long{data.x[j + 2]} - data.x[j + 1];
+        q[j][j] = 1 / h;
+        q[j + 1][j] = -1 / h - 1 / next;
+        q[j + 2][j] = 1 / next;
+        r[j][j] = (h + next) / 3;
+        if (j + 1 < m)
+            r[j][j + 1] = r[j + 1][j] = next / 6;
+    }
+    const Square inverse = Inverse(r);
+    for (std::size_t i = 0; i < n; ++i) {
+        sum[i][i] = 1 / (Long{data.d[i]} * data.d[i]);
+        for (std::size_t k = 0; k < n; ++k)
+            for (std::size_t j = i < 2 ? 0 : i - 2; j <= i && j < m; ++j)
+                for (std::size_t l = k < 2 ? 0 : k - 2; l <= k && l < m; ++l)
+                    sum[i][k] += lambda * q[i][j] * inverse[j][l] * q[k][l];
+    }
+    Square a = Inverse(sum);
+    for (auto &row : a)
+        for (std::size_t k = 0; k < n; ++k)
+            row[k] /= Long{data.d[k]} * data.d[k];
+    return a;
+}
+
+struct Exact {
+    std::vector<Long> values;
+    Long trace, squares, score;
+};
+Exact Densely(const Data &data, Long lambda) {
+    const Square a = Influence(data, lambda);
+    Exact exact = {{}, 0, 0, 0};
+    for (std::size_t i = 0; i < a.size(); ++i) {
+        exact.values.push_back(
+            std::inner_product(a[i].begin(), a[i].end(), data.y.begin(), Long{0}));
+        exact.trace += a[i][i];
+        const Long u = (data.y[i] - exact.values[i]) / data.d[i];
+        exact.squares += u * u;
+    }
+    const Long rest = a.size() - exact.trace;
+    exact.score = exact.squares / (rest * rest);
+    return exact;
+}
+
+TEST(SmoothingSplines, MinimiseAsTheDenseSolution) {
+    for (const int n : {3, 4, 9, 60}) {
+        const Data data = Noisy(n);
+        for (const double lambda : {1e-9, 1e-3, 1.0, 1e4}) {
+            const Exact exact = Densely(data, lambda);
+            const Smoothed found = Smooth(data.x, data.y, data.d, 1, lambda);
+            ASSERT_EQ(found.code, 0);
+            EXPECT_EQ(found.lambda, lambda);
+            EXPECT_NEAR(found.effective, static_cast<double>(exact.trace), 1e-10) << n;
+            for (int i = 0; i < n; ++i)
+                ASSERT_NEAR(found.values[i], static_cast<double>(exact.values[i]), 1e-12) << lambda;
+        }
+    }
+}
+
+TEST(SmoothingSplines, CrossValidationFindsTheLeastScore) {
+    for (const int n : {40, 150}) {
+        const Data data = Noisy(n);
+        const Smoothed found = Smooth(data.x, data.y, data.d, 0, nan);
+        ASSERT_EQ(found.code, 0);
+        const Long least = Densely(data, found.lambda).score;
+        for (const double factor : {1e-3, 0.1, 0.9, 1.1, 10.0, 1e3})
+            EXPECT_LT(least, Densely(data, found.lambda * factor).score) << factor;
+    }
+}
+
+TEST(SmoothingSplines, SmoothestWithinASumOfSquares) {
+    const Data data = Noisy(30);
+    for (const double limit : {1e-6, 0.02, 1.0}) {
+        const Smoothed found = Smooth(data.x, data.y, data.d, 2, limit);
+        const Exact exact = Densely(data, found.lambda);
+        EXPECT_NEAR(static_cast<double>(exact.squares) / limit, 1.0, 1e-9);
+    }
+    const Smoothed line = Smooth(data.x, data.y, data.d, 2, 1e6);
+    EXPECT_EQ(line.lambda, infinity);
+    EXPECT_EQ(line.effective, 2.0);
+    Rows terms;
+    Samples w;
+    for (std::size_t i = 0; i < data.x.size(); ++i) {
+        terms.push_back({1.0, data.x[i]});
+        w.push_back(1.0 / (data.d[i] * data.d[i]));
+    }
+    const auto exact = SolveNormal(terms, data.y, w);
+    for (std::size_t i = 0; i < data.x.size(); ++i)
+        EXPECT_NEAR(line.values[i], static_cast<double>(exact.c[0] + exact.c[1] * data.x[i]),
+                    1e-13);
+}
+
+TEST(SmoothingSplines, PiecesMeetSmoothlyAndInterpolateWithoutLambda) {
+    const Data data = Noisy(12);
+    for (const double lambda : {0.0, 0.3}) {
+        const Smoothed found = Smooth(data.x, data.y, {}, 1, lambda);
+        ASSERT_EQ(found.code, 0);
+        ASSERT_EQ(found.pieces.size(), 44U);
+        EXPECT_EQ(found.second.front(), 0.0);
+        EXPECT_EQ(found.second.back(), 0.0);
+        for (int i = 0; i < 11; ++i) {
+            const double *const c = found.pieces.data() + 4 * i, h = data.x[i + 1] - data.x[i];
+            EXPECT_NEAR(c[0] + h * (c[1] + h * (c[2] + h * c[3])), found.values[i + 1], 1e-13);
+            if (i < 10) {
+                EXPECT_NEAR(c[1] + h * (2 * c[2] + 3 * h * c[3]), c[5], 1e-12);
+                EXPECT_NEAR(2 * c[2] + 6 * h * c[3], found.second[i + 1], 1e-12);
+            }
+            if (lambda == 0.0) {
+                EXPECT_EQ(found.values[i], data.y[i]);
+            }
+        }
+    }
+    const Smoothed one = Smooth({2}, {5}, {}, 0, 0), two = Smooth({2, 4}, {5, 9}, {}, 2, 0);
+    EXPECT_EQ(one.values, Samples{5});
+    EXPECT_EQ(one.effective, 1.0);
+    EXPECT_EQ(two.pieces, (Samples{5, 2, 0, 0}));
+    EXPECT_EQ(two.lambda, 0.0);
+}
+
+struct Fitted {
+    ErrorCode code;
+    Samples knots, c, values;
+    double mse;
+};
+Fitted FitB(const Samples &x, const Samples &y, const Samples &w, int32_t degree, int32_t interior,
+            const Samples &given = {}) {
+    const DBLArray knots, c, values;
+    Fitted result = {};
+    result.code = BSplineFit_head(DBLArray(x).handle(), DBLArray(y).handle(), DBLArray(w).handle(),
+                                  degree, interior, DBLArray(given).handle(), knots.handle(),
+                                  c.handle(), values.handle(), &result.mse);
+    result.knots = knots.values();
+    result.c = c.values();
+    result.values = values.values();
+    return result;
+}
+
+// The basis from its recursive definition, closed at the right end.
+double Basis(const Samples &t, std::size_t i, int degree, double x) {
+    if (degree == 0)
+        return (t[i] <= x && x < t[i + 1]) ||
+               (x == t.back() && t[i] < t[i + 1] && t[i + 1] == t.back());
+    const double left = t[i + degree] - t[i], right = t[i + degree + 1] - t[i + 1];
+    return (left > 0 ? (x - t[i]) / left * Basis(t, i, degree - 1, x) : 0.0) +
+           (right > 0 ? (t[i + degree + 1] - x) / right * Basis(t, i + 1, degree - 1, x) : 0.0);
+}
+
+TEST(SmoothingSplines, LeastSquaresInTheirDefinition) {
+    const Data data = Noisy(80);
+    for (const int degree : {1, 2, 3, 5, 9})
+        for (const bool isGiven : {false, true}) {
+            const double middle = data.x[40];
+            const Samples given = isGiven ? Samples{data.x[20], middle, middle} : Samples();
+            const Fitted found = FitB(data.x, data.y, data.d, degree, 4, given);
+            ASSERT_EQ(found.code, 0) << degree;
+            Rows rows;
+            for (const double x : data.x) {
+                rows.emplace_back();
+                for (std::size_t j = 0; j < found.c.size(); ++j)
+                    rows.back().push_back(Basis(found.knots, j, degree, x));
+            }
+            const auto exact = SolveNormal(rows, data.y, data.d);
+            for (std::size_t j = 0; j < found.c.size(); ++j)
+                EXPECT_NEAR(found.c[j], static_cast<double>(exact.c[j]), 1e-10) << degree;
+            const auto model = [&](std::size_t i) {
+                return std::inner_product(rows[i].begin(), rows[i].end(), exact.c.begin(), Long{0});
+            };
+            EXPECT_NEAR(found.values[79], static_cast<double>(model(79)), 1e-11);
+            EXPECT_NEAR(found.mse, static_cast<double>(qx::test::MeanSquare(data.y, data.d, model)),
+                        1e-13);
+            EXPECT_EQ(found.knots[degree], data.x[0]);
+            if (!isGiven) {
+                EXPECT_NEAR(found.knots[degree + 1], data.x[15] * 0.2 + data.x[16] * 0.8, 1e-14);
+            }
+        }
+}
+
+TEST(SmoothingSplines, CodesInTheirOrder) {
+    const Samples x = {1, 2, 3, 4}, y = {1, 3, 2, 4};
+    EXPECT_EQ(Smooth({}, y, {}, 9, 0).code, ErrEmptyInput);
+    EXPECT_EQ(Smooth(x, {1, 2}, {}, 9, 0).code, ErrSizeMismatch);
+    EXPECT_EQ(Smooth(x, y, {1}, 9, 0).code, ErrSizeMismatch);
+    EXPECT_EQ(Smooth(x, {1, 2, 3, nan}, {}, 3, 0).code, ErrInvalidSelector);
+    EXPECT_EQ(Smooth(x, {1, 2, 3, nan}, {1, 1, 1, 0}, 1, -1).code, ErrNonFiniteInput);
+    EXPECT_EQ(Smooth(x, y, {}, 2, infinity).code, ErrNonFiniteInput);
+    EXPECT_EQ(Smooth(x, y, {1, 1, 1, 0}, 1, -1).code, ErrNotStrictlyPositive);
+    for (const double parameter : {-1.0, nan, -infinity})
+        EXPECT_EQ(Smooth({1, 1, 3, 4}, y, {}, 1, parameter).code, ErrNegativeSetting);
+    EXPECT_EQ(Smooth({1, 1, 3, 4}, y, {}, 1, 0).code, ErrAbscissaeOrder);
+    EXPECT_TRUE(std::isnan(Smooth({1, 1, 3, 4}, y, {}, 1, 0).lambda));
+
+    EXPECT_EQ(FitB({}, y, {}, 0, 0).code, ErrEmptyInput);
+    EXPECT_EQ(FitB(x, y, {1}, 0, 0).code, ErrSizeMismatch);
+    EXPECT_EQ(FitB(x, y, {}, 0, -1).code, ErrOrderNotPositive);
+    EXPECT_EQ(FitB(x, y, {}, 10, -1).code, ErrOrderNotPositive);
+    EXPECT_EQ(FitB({1, 2, 3, nan}, y, {}, 1, -1).code, ErrNegativeCount);
+    EXPECT_EQ(FitB({1, 2, 0, nan}, y, {}, 1, 0).code, ErrNonFiniteInput);
+    EXPECT_EQ(FitB(x, y, {}, 1, 0, {nan}).code, ErrNonFiniteInput);
+    EXPECT_EQ(FitB({1, 2, 0, 4}, y, {}, 9, 0).code, ErrAbscissaeOrder);
+    for (const Samples &knots :
+         {Samples{1.0}, Samples{4.0}, Samples{3, 2}, Samples{2, 2, 2}, Samples{-1.0}})
+        EXPECT_EQ(FitB(x, y, {}, 1, 0, knots).code, ErrAbscissaeOrder);
+    EXPECT_EQ(FitB(x, y, {}, 1, 3).code, ErrPolynomialOrderTooHigh);
+    EXPECT_EQ(FitB(x, y, {}, 9, 2147483647).code, ErrPolynomialOrderTooHigh);
+    EXPECT_EQ(FitB({2, 2, 2, 2}, y, {}, 1, 0).code, ErrPolynomialOrderTooHigh);
+    EXPECT_EQ(FitB({1, 1, 1, 4}, y, {}, 2, 0).code, ErrPolynomialOrderTooHigh);
+    EXPECT_EQ(FitB(x, y, {1, 0, 0, 1}, 2, 0).code, ErrPolynomialOrderTooHigh);
+    EXPECT_EQ(FitB({1, 1, 2, 4}, y, {}, 2, 0).code, 0);
+}
+
+} // namespace
