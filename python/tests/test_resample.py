@@ -123,6 +123,14 @@ class Resample(unittest.TestCase):
                 self.assertEqual(f", {expected} in place of {subtype}\n" in ran.stdout, subtype != expected)
                 self.assertLess(decibel(soundfile.read(target)[0][::2][20:-20] - sound[20:-20]), -60)
 
+    def test_a_file_that_is_cut_off_is_reported(self):
+        soundfile.write(self.source, 0.1 * tone(500, 8000, 1000), 8000, "PCM_16")
+        with open(self.source, "r+b") as file:
+            file.truncate(2044)
+        ran = self.command(self.source, self.target, "--rate", "16000")
+        self.assertEqual(ran.returncode, 0)
+        self.assertRegex(ran.stderr, r"^qx: .*: the file is cut off: 2000 of 4000 bytes.*\n$")
+
     def test_clipping_is_told(self):
         square = np.sign(np.sin(2 * np.pi * 0.01 * (np.arange(2000) + 0.5)))
         for subtype, clipped in (("PCM_16", True), ("FLOAT", False)):

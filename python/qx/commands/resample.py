@@ -28,7 +28,7 @@ def rate(text):
 def resample(options):
     import tqdm
 
-    from .. import outputs
+    from .. import audio, outputs
     from ..resampling import opened, resample_file
     outputs.check(options.target, options.force, inputs=outputs.identities([options.source]))
     with opened(options.source) as source:
@@ -37,6 +37,8 @@ def resample(options):
                        disable=not sys.stderr.isatty()) as bar:
             done = resample_file(source, options.target, options.rate, bar.update)
         print(f"{options.source}: {done.read} frames at {source.samplerate} Hz")
+    if wrong := audio.wrong_length(options.source, done.read):
+        print(f"qx: {options.source}: {wrong}", file=sys.stderr)
     written = -(-done.read * done.up // done.down)
     print(f"{options.target}: {written} frames at {options.rate} Hz{done.format_note}")
     if done.clipped:
