@@ -22,14 +22,14 @@
 
 QX_BEGIN_DECLS
 
-/** Solves for x (m by n), with a m by m, b n by n and c m by n: equation 0 is a x + x b = c, 1 is
-    a x - x b = c, 2 is a x b - x = c.
+/** Solves for x (m by n), with a m by m, b n by n and c m by n. equation: 0 a x + x b = c; 1
+    a x - x b = c; 2 a x b - x = c.
     Codes: ErrEmptyInput (a matrix is empty), ErrNotSquare (a or b), ErrSizesDisagree (c is not m by
     n), ErrInvalidSelector (equation), ErrNonFiniteInput (an element of a, b or c),
     ErrIterationLimit (the iteration for a Schur form does not converge), ErrSingularMatrix (for
     eigenvalues l of a and m of b |l + m|, in equation 1 |l - m|, is at most eps (|a| + |b|), or in
     equation 2 |l m - 1| at most eps (|a| |b| + 1), with Frobenius norms), ErrOverflow (an element
-   of x is too large), ErrOutOfMemory (no memory). */
+    of x is too large), ErrOutOfMemory (no memory). */
 QX_API ErrorCode Sylvester2011_head(QX_IN DBL2D a, QX_IN DBL2D b, QX_IN DBL2D c, int32_t equation,
                                     QX_OUT DBL2D x);
 /** As Sylvester2011_head, for complex elements. */
@@ -40,12 +40,12 @@ QX_API ErrorCode Sylvester_head(QX_IN DBL2D a, QX_IN DBL2D b, QX_IN DBL2D c, QX_
 /** As Sylvester_head, for complex elements. */
 QX_API ErrorCode CxSylvester_head(QX_IN CDB2D a, QX_IN CDB2D b, QX_IN CDB2D c, QX_OUT CDB2D x);
 
-/** Solves for x, all matrices n by n: equation 0 is a x + x a' = q (continuous time), 1 is
+/** Solves for x, all matrices n by n. equation: 0 a x + x a' = q (continuous time); 1
     a x a' - x + q = 0 (discrete time). Mind the sign of q, which differs: for a stable a and a
-   positive definite q, x is negative definite under equation 0 and positive definite under
-   equation 1. Where q is symmetric (Hermitian) to the bit, x is so too; any other q is accepted.
+    positive definite q, x is negative definite under equation 0 and positive definite under
+    equation 1. Where q is symmetric (Hermitian) to the bit, x is so too; any other q is accepted.
     Codes: ErrEmptyInput (a matrix is empty), ErrNotSquare (a or q), ErrSizesDisagree (a and q
-   differ in order), ErrInvalidSelector (equation), ErrNonFiniteInput (an element of a or q),
+    differ in order), ErrInvalidSelector (equation), ErrNonFiniteInput (an element of a or q),
     ErrIterationLimit (the iteration for the Schur form does not converge), ErrSingularMatrix (for
     eigenvalues l and m of a, which may be the same, |l + conj(m)| is at most 2 eps |a|, or in
     equation 1 |l conj(m) - 1| at most eps (|a|^2 + 1), with the Frobenius norm), ErrOverflow (an

@@ -92,8 +92,8 @@ QX_API ErrorCode PolyEv(QX_IN DBL1D p, QX_IN DBL1D x, QX_OUT DBL1D y);
     arithmetic", 2012), with a small multiple of the bound. */
 QX_API ErrorCode CxPolyEv(QX_IN CDB1D p, QX_IN CDB1D x, QX_OUT CDB1D y);
 
-/** A polynomial of a matrix, y as large as a. mode 0: y[i][j] = p(a[i][j]), with values as of
-    PolyEv. mode 1: y = p[0] I + p[1] a + p[2] a a + ... for a square matrix, with about 2
+/** A polynomial of a matrix, y as large as a. mode: 0 y[i][j] = p(a[i][j]), with values as of
+    PolyEv; 1 y = p[0] I + p[1] a + p[2] a a + ... of a square matrix. Mode 1 takes about 2
     sqrt(degree) products of matrices (M. S. Paterson and L. J. Stockmeyer, "On the number of
     nonscalar multiplications necessary to evaluate polynomials", 1973), uncompensated. An empty
     matrix gives an empty one.

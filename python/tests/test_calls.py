@@ -422,7 +422,9 @@ class Selectors(unittest.TestCase):
         # Fields of records and amounts; others are those of a twin that has the argument.
         self.assertEqual(silent, {"QZ_head", "CxQZ_head", "TriLinEqs_head", "CxTriLinEqs_head",
                                   "Tri_InvMatrix_head", "CxTri_InvMatrix_head", "CoordRotationEuler_head",
-                                  "Euler2Direction_head", "GammaNoiseH", "PoissonNoiseH", "BinomialNoiseH", "PeakD"})
+                                  "Euler2Direction_head", "Sylvester_head", "CxSylvester_head",
+                                  "Lyapunov_head", "CxLyapunov_head", "GammaNoiseH", "PoissonNoiseH",
+                                  "BinomialNoiseH", "PeakD"})
 
 
 class Functions(unittest.TestCase):
