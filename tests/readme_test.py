@@ -54,7 +54,7 @@ NAMES = {"peaks FILE": "peaks measurement.csv", "pulse FILE": "pulse measurement
 AFTERWARDS = {
     "./run": "[ -s out/report.html ]",
     "./run recordings/": "[ -s out/index.html ]",
-    "python3 -m qx resample": "[ -s OUT.wav ]",
+    "python3 -m qx resample": "[ -s OUT.flac ]",
     "python3 -m venv": "(cd / && unset PYTHONPATH && ~/qx/bin/python3 -c 'import qx, sys;"
                        " assert qx.__file__.startswith(sys.prefix); assert qx.Mean_head([1.0, 3.0]) == 2.0')",
     "cc -Iinclude": "./a.out | grep '^2.33333 ('",
