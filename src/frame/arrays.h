@@ -108,6 +108,17 @@ protected:
     AnyHandle handle_;
 };
 
+// The view of a block of numbers for inner routines (frame/views.h).
+template <bool Writable, class Handle>
+auto ViewOf(const Block<Handle> &block,
+            typename detail::ViewedElement<HandleTraits<Handle>::code, Writable>::type *elements) {
+    if constexpr (HandleTraits<Handle>::dimensions == 1)
+        return BasicVectorView<HandleTraits<Handle>::code, Writable>(elements, block.size());
+    else
+        return BasicMatrixView<HandleTraits<Handle>::code, Writable>(elements, block.rows(),
+                                                                     block.cols());
+}
+
 // An input.
 template <class Handle>
 class In : public Block<Handle> {
@@ -116,6 +127,8 @@ class In : public Block<Handle> {
 public:
     In(Handle handle) : Base(reinterpret_cast<typename Base::AnyHandle>(handle)) {}
     const typename Base::T *data() const { return this->elements(); }
+    // The elements for inner routines, until the next resize of an output.
+    auto view() const { return ViewOf<false>(*this, this->elements()); }
 
     // For the frame: an input that is an output of the same call reads a copy from here on.
     auto inputs() { return std::tie(*this); }
@@ -141,6 +154,7 @@ class Spoiled : public In<Handle> {
 public:
     using In<Handle>::In;
     typename In<Handle>::T *data() const { return this->elements(); }
+    auto view() const { return ViewOf<true>(*this, this->elements()); }
 };
 
 // An output. EmptyCode is the element type that the host is told when the output is emptied; it
@@ -165,6 +179,8 @@ public:
           address_(reinterpret_cast<AnyHandle *>(&handle)) {}
 
     typename Base::T *data() const { return this->elements(); }
+    // The elements for inner routines, until the next resize.
+    auto view() const { return ViewOf<true>(*this, this->elements()); }
 
     Outcome resize(int32_t count) requires(dimensions == 1) {
         const int32_t hostStatus = reshape(code, count);

@@ -187,10 +187,55 @@ ErrorCode ScratchRealloc(void **block, int32_t size, int32_t) {
     return ScratchRealloc(block, size);
 }
 
-void *RawAlloc(int32_t size, int32_t) {
-    return size < 0 ? nullptr : std::malloc(static_cast<std::size_t>(size));
+ErrorCode ScratchParts::takeBlock(int64_t bytes, void **block) {
+    bytes += static_cast<int64_t>(sizeof last_);
+    if (bytes > std::numeric_limits<int32_t>::max())
+        return ErrOutOfMemory;
+    void *taken;
+    if (const ErrorCode failed = ScratchAlloc(&taken, static_cast<int32_t>(bytes)))
+        return failed;
+    std::memcpy(taken, &last_, sizeof last_);
+    last_ = taken;
+    *block = static_cast<char *>(taken) + sizeof last_;
+    return 0;
 }
 
-void RawFree(void *block) { std::free(block); }
+ErrorCode ScratchParts::takeBlocks(const int64_t *bytes, void **places, std::size_t count) {
+    constexpr int64_t sharedUpTo = int64_t{1} << 20;
+    release();
+    int64_t total = 0;
+    for (std::size_t i = 0; i < count; ++i) {
+        if (bytes[i] < 0)
+            return ErrOutOfMemory;
+        total += (bytes[i] + 7) / 8 * 8;
+    }
+    if (total <= sharedUpTo) {
+        void *block;
+        if (const ErrorCode failed = takeBlock(total, &block))
+            return failed;
+        char *at = static_cast<char *>(block);
+        for (std::size_t i = 0; i < count; ++i) {
+            places[i] = at;
+            at += (bytes[i] + 7) / 8 * 8;
+        }
+        return 0;
+    }
+    for (std::size_t i = 0; i < count; ++i)
+        if (const ErrorCode failed = takeBlock(bytes[i], &places[i])) {
+            release();
+            return failed;
+        }
+    return 0;
+}
+
+ErrorCode ScratchParts::release() {
+    ErrorCode status = 0;
+    while (last_ != nullptr) {
+        void *const block = last_;
+        std::memcpy(&last_, block, sizeof last_);
+        status = Merge(status, ScratchFree(block));
+    }
+    return status;
+}
 
 } // namespace qx

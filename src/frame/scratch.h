@@ -2,8 +2,10 @@
 #define QX_FRAME_SCRATCH_H
 
 #include "frame/elements.h"
+#include "frame/views.h"
 #include "qx/errors.h"
 
+#include <array>
 #include <cstdint>
 #include <limits>
 #include <utility>
@@ -29,10 +31,6 @@ ErrorCode ScratchRealloc(void **block, int32_t size, int32_t ignored);
 // The same where a failure frees the block in any case and sets *block to null.
 ErrorCode ScratchReallocOrFree(void **block, int32_t size);
 
-// Straight from the heap, with no header. The alignment is ignored.
-void *RawAlloc(int32_t size, int32_t alignment);
-void RawFree(void *block);
-
 // At process attach: from here on the table of heap functions serves what the workspace does
 // not. Blocks taken earlier go back to where they came from.
 void AttachScratchHeap();
@@ -42,6 +40,12 @@ void AttachScratchHeap();
 inline ErrorCode Merge(ErrorCode status, ErrorCode cleanUp) {
     const bool replaces = status == 0 || (status > 0 && cleanUp < 0);
     return replaces ? cleanUp : status;
+}
+
+// The bytes of `count` elements of `size`, or -1 where no block of the host holds them.
+inline int64_t BytesOf(int64_t count, std::size_t size) {
+    const int64_t limit = std::numeric_limits<int32_t>::max() / static_cast<int64_t>(size);
+    return count < 0 || count > limit ? -1 : count * static_cast<int64_t>(size);
 }
 
 // A scratch block of bytes that is given back with the scope, or by whom it is moved to.
@@ -103,13 +107,80 @@ public:
     T &operator[](std::ptrdiff_t i) const { return data()[i]; }
 
 private:
-    // Too many count as a size that cannot be had.
-    static int64_t bytesOf(int64_t count) {
-        constexpr int64_t limit = std::numeric_limits<int32_t>::max() / int64_t{sizeof(T)};
-        return count < 0 || count > limit ? -1 : count * int64_t{sizeof(T)};
-    }
+    static int64_t bytesOf(int64_t count) { return BytesOf(count, sizeof(T)); }
 
     ScratchBytes block_;
+};
+
+// Several blocks at once, by one statement that says size and place together:
+//     RealVector weights;
+//     ComplexMatrix factors;
+//     I32 *pivots;
+//     ScratchParts memory;
+//     if (const ErrorCode failed =
+//             memory.take(Sized(weights, n), Sized(factors, n, n), Sized(pivots, n)))
+//         return failed;
+// The parts live as long as `memory`, or until it takes others. They start at multiples of 8 bytes
+// from the start of a block, which may be any byte.
+
+// A view or a pointer that is to be given memory; bytes is below 0 where no size holds it.
+template <class Place>
+struct ScratchPart {
+    Place place;
+    int64_t bytes;
+};
+
+template <ElementType E>
+auto Sized(VectorView<E> &view, int64_t count) {
+    typedef typename VectorView<E>::T T;
+    const auto place = [&view, count](void *at) {
+        view = VectorView<E>(static_cast<T *>(at), static_cast<std::ptrdiff_t>(count));
+    };
+    return ScratchPart<decltype(place)>{place, BytesOf(count, sizeof(T))};
+}
+template <ElementType E>
+auto Sized(MatrixView<E> &view, int32_t rows, int32_t cols) {
+    typedef typename MatrixView<E>::T T;
+    const auto place = [&view, rows, cols](void *at) {
+        view = MatrixView<E>(static_cast<T *>(at), rows, cols);
+    };
+    return ScratchPart<decltype(place)>{place, BytesOf(int64_t{rows} * cols, sizeof(T))};
+}
+template <class T>
+auto Sized(T *&pointer, int64_t count) {
+    const auto place = [&pointer](void *at) { pointer = static_cast<T *>(at); };
+    return ScratchPart<decltype(place)>{place, BytesOf(count, sizeof(T))};
+}
+
+class ScratchParts {
+public:
+    ScratchParts() = default;
+    ScratchParts(const ScratchParts &) = delete;
+    ScratchParts &operator=(const ScratchParts &) = delete;
+    ~ScratchParts() { release(); }
+
+    // ErrOutOfMemory, and then nothing is taken and no place is set.
+    template <class... Places>
+    ErrorCode take(const ScratchPart<Places> &...parts) {
+        const std::array<int64_t, sizeof...(parts)> bytes{parts.bytes...};
+        std::array<void *, sizeof...(parts)> places;
+        if (const ErrorCode failed = takeBlocks(bytes.data(), places.data(), sizeof...(parts)))
+            return failed;
+        std::size_t at = 0;
+        (parts.place(places[at++]), ...);
+        return 0;
+    }
+
+    // Gives all parts back early; the status is meant for Merge.
+    ErrorCode release();
+
+private:
+    // Parts that fit into a mebibyte share a block; larger ones have a block each, so that they
+    // need no more memory in one piece than the largest of them.
+    ErrorCode takeBlocks(const int64_t *bytes, void **places, std::size_t count);
+    ErrorCode takeBlock(int64_t bytes, void **block);
+
+    void *last_ = nullptr; // each block starts with the address of the one before
 };
 
 } // namespace qx

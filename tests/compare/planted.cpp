@@ -46,7 +46,7 @@ int32_t RMS_head(DBL1D x, DBL *rms, ErrorCode *err) {
 // Another code.
 int32_t Mean_head(DBL1D x, DBL *mean, ErrorCode *err) {
     const int32_t result = Original(Mean_head, "Mean_head")(x, mean, err);
-    if (*err == ErrEmptyInput)
+    if ((*x)->dimSize == 8)
         *err = ErrOutOfMemory;
     return result;
 }

@@ -64,7 +64,6 @@ TEST(Scratch, SizesThatInt32CannotHoldAreRefused) {
     EXPECT_EQ(complexes.allocate(most / 16 + 1), ErrOutOfMemory);
     EXPECT_EQ(complexes.allocate(-1), ErrOutOfMemory);
     EXPECT_EQ(complexes.resize(most / 16 + 1), ErrOutOfMemory);
-    EXPECT_EQ(qx::RawAlloc(-1, 32), nullptr);
 }
 
 // The first request of the process latches the default mode; before the attach that is the plain
@@ -95,6 +94,42 @@ TEST(Scratch, BlocksGoBackToWhereTheyCameFrom) {
         qx::ScratchFree(whileDisabled);
     }
     EXPECT_EQ(qx::ScratchFree(nullptr), 0);
+}
+
+TEST(Scratch, PartsAreTakenTogetherOrNotAtAll) {
+    const EnabledRegion region(uint32_t{1} << 22);
+    qx::RealVector x;
+    qx::ComplexMatrix z;
+    I32 *indices = nullptr;
+    uint8_t *flags = nullptr;
+    qx::ScratchParts memory;
+    // In one block, and in one each: 32 rows are below a mebibyte, 400 are above.
+    for (const int32_t rows : {32, 400}) {
+        ASSERT_EQ(memory.take(qx::Sized(flags, 5), qx::Sized(x, 3), qx::Sized(z, rows, 200),
+                              qx::Sized(indices, 7)),
+                  0);
+        EXPECT_EQ(analysisWorkspace.liveBlocks(), rows == 32 ? 1u : 4u);
+        EXPECT_EQ(x.size(), 3);
+        EXPECT_EQ(z.rows(), rows);
+        EXPECT_EQ(z.stride(), 200);
+        std::fill_n(flags, 5, uint8_t{1});
+        qx::Fill(x.data(), 3, 2.0);
+        for (int64_t i = 0; i < z.count(); ++i)
+            z.elements()[i] = CDB{3.0, 3.0};
+        std::fill_n(indices, 7, 4);
+        EXPECT_EQ(std::count(flags, flags + 5, uint8_t{1}), 5);
+        EXPECT_EQ(x[0] + x[1] + x[2], 6.0);
+        EXPECT_EQ(z(rows - 1, 199).im + z(0, 0).re, 6.0);
+        EXPECT_EQ(indices[0] + indices[6], 8);
+    }
+    // The last part has no room: what came before it goes back, and no place is set.
+    const double *const before = x.data();
+    EXPECT_EQ(memory.take(qx::Sized(x, 1 << 18), qx::Sized(flags, int64_t{1} << 31)),
+              ErrOutOfMemory);
+    EXPECT_EQ(memory.take(qx::Sized(x, 1 << 18), qx::Sized(z, 1 << 15, 1 << 15)), ErrOutOfMemory);
+    EXPECT_EQ(memory.take(qx::Sized(x, 2), qx::Sized(indices, -1)), ErrOutOfMemory);
+    EXPECT_EQ(x.data(), before);
+    EXPECT_EQ(analysisWorkspace.liveBlocks(), 0u);
 }
 
 TEST(Scratch, ABlockMovesGrowsAndShrinksWithItsContent) {

@@ -1,0 +1,132 @@
+#ifndef QX_FRAME_VIEWS_H
+#define QX_FRAME_VIEWS_H
+
+#include "frame/elements.h"
+#include "frame/expects.h"
+
+#include <cstddef>
+#include <cstdint>
+
+namespace qx {
+
+// Views of elements that somebody else owns: two to four words, handed on by value. Inner routines
+// take them in place of a pointer with its sizes. They are keyed by the element's code and not by
+// its C++ type, because a template argument would drop the alignment that the types carry.
+//
+// VectorView<E> and MatrixView<E> may be written through, ConstVectorView<E> and ConstMatrixView<E>
+// may not; the former become the latter by themselves. Inner routines that are templates of E are
+// called with it, Solve<E>(a, b, x), and defined for both element types by
+//     template ErrorCode Solve<ElementType::DBL>(...);
+//     template ErrorCode Solve<ElementType::CDB>(...);
+// in their source file.
+
+namespace detail {
+template <ElementType E, bool Writable>
+struct ViewedElement {
+    typedef const typename Element<E>::type type;
+};
+template <ElementType E>
+struct ViewedElement<E, true> {
+    typedef typename Element<E>::type type;
+};
+} // namespace detail
+
+template <ElementType E, bool Writable>
+class BasicVectorView {
+public:
+    typedef typename detail::ViewedElement<E, Writable>::type T;
+    static constexpr ElementType code = E;
+
+    BasicVectorView() = default;
+    BasicVectorView(T *data, std::ptrdiff_t size) : data_(data), size_(size) {
+        QX_EXPECTS(size >= 0);
+    }
+    operator BasicVectorView<E, false>() const requires Writable { return {data_, size_}; }
+
+    T *data() const { return data_; }
+    std::ptrdiff_t size() const { return size_; }
+    bool isEmpty() const { return size_ == 0; }
+    T &operator[](std::ptrdiff_t i) const { return data_[i]; }
+    T *begin() const { return data_; }
+    T *end() const { return data_ + size_; }
+
+    // `count` elements from element `first` on.
+    BasicVectorView part(std::ptrdiff_t first, std::ptrdiff_t count) const {
+        QX_EXPECTS(first >= 0 && count >= 0 && first + count <= size_);
+        return {data_ + first, count};
+    }
+
+private:
+    T *data_ = nullptr;
+    std::ptrdiff_t size_ = 0;
+};
+
+// Row after row; `stride` elements from a row to the next one.
+template <ElementType E, bool Writable>
+class BasicMatrixView {
+public:
+    typedef typename detail::ViewedElement<E, Writable>::type T;
+    static constexpr ElementType code = E;
+
+    BasicMatrixView() = default;
+    BasicMatrixView(T *data, int32_t rows, int32_t cols)
+        : BasicMatrixView(data, rows, cols, cols) {}
+    BasicMatrixView(T *data, int32_t rows, int32_t cols, std::ptrdiff_t stride)
+        : data_(data), rows_(rows), cols_(cols), stride_(stride) {
+        QX_EXPECTS(rows >= 0 && cols >= 0 && stride >= cols);
+    }
+    operator BasicMatrixView<E, false>() const requires Writable {
+        return {data_, rows_, cols_, stride_};
+    }
+
+    T *data() const { return data_; }
+    int32_t rows() const { return rows_; }
+    int32_t cols() const { return cols_; }
+    std::ptrdiff_t stride() const { return stride_; }
+    bool isEmpty() const { return rows_ == 0 || cols_ == 0; }
+    bool isSquare() const { return rows_ == cols_; }
+    // Its elements follow one another without a gap.
+    bool isWhole() const { return stride_ == cols_; }
+    int64_t count() const { return int64_t{rows_} * cols_; }
+
+    T *row(std::ptrdiff_t i) const { return data_ + i * stride_; }
+    T &operator()(std::ptrdiff_t i, std::ptrdiff_t j) const { return data_[i * stride_ + j]; }
+
+    // The matrix of `rows` by `cols` whose first element is (i, j).
+    BasicMatrixView block(int32_t i, int32_t j, int32_t rows, int32_t cols) const {
+        QX_EXPECTS(i >= 0 && j >= 0 && i + rows <= rows_ && j + cols <= cols_);
+        return {data_ + i * stride_ + j, rows, cols, stride_};
+    }
+    // All elements of a matrix that is whole.
+    BasicVectorView<E, Writable> elements() const {
+        QX_EXPECTS(isWhole());
+        return {data_, static_cast<std::ptrdiff_t>(count())};
+    }
+
+private:
+    T *data_ = nullptr;
+    int32_t rows_ = 0, cols_ = 0;
+    std::ptrdiff_t stride_ = 0;
+};
+
+template <ElementType E>
+using VectorView = BasicVectorView<E, true>;
+template <ElementType E>
+using ConstVectorView = BasicVectorView<E, false>;
+template <ElementType E>
+using MatrixView = BasicMatrixView<E, true>;
+template <ElementType E>
+using ConstMatrixView = BasicMatrixView<E, false>;
+
+typedef VectorView<ElementType::DBL> RealVector;
+typedef ConstVectorView<ElementType::DBL> ConstRealVector;
+typedef MatrixView<ElementType::DBL> RealMatrix;
+typedef ConstMatrixView<ElementType::DBL> ConstRealMatrix;
+typedef VectorView<ElementType::CDB> ComplexVector;
+typedef ConstVectorView<ElementType::CDB> ConstComplexVector;
+typedef MatrixView<ElementType::CDB> ComplexMatrix;
+typedef ConstMatrixView<ElementType::CDB> ConstComplexMatrix;
+
+} // namespace qx
+
+#endif
