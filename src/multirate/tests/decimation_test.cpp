@@ -523,8 +523,8 @@ TEST(Decimation, ModulatorsShiftAStreamInFrequency) {
         phase = 0;
         const double rate = frequency > 1 ? 1e-300 : 0.0;
         EXPECT_EQ(ReComplexModulatorH(r.handle(), frequency, rate, &phase, y.handle()), 0);
-        EXPECT_EQ(Get(y)[0].re, Get(r)[0]);
-        EXPECT_TRUE(std::isnan(Get(y)[1].re) && std::isnan(phase));
+        EXPECT_EQ(Get(y)[0].real(), Get(r)[0]);
+        EXPECT_TRUE(std::isnan(Get(y)[1].real()) && std::isnan(phase));
     }
 }
 
