@@ -1,6 +1,9 @@
 #include "fit/b_spline.h"
 
-#include "fit/banded_triangle.h"
+#include "fit/b_spline_spans.h"
+#include "fit/weights.h"
+#include "frame/constants.h"
+#include "frame/scratch.h"
 
 #include <algorithm>
 #include <cmath>
@@ -9,42 +12,85 @@ namespace qx {
 
 namespace {
 
-// The degree + 1 splines that are not 0 in the span knots[span] to knots[span + 1], by the
-// recurrence of M. G. Cox and C. de Boor (1972).
-void BasisAt(double x, const DBL *knots, int32_t span, int32_t degree, DBL *basis) {
-    double left[BandedTriangle::widest], right[BandedTriangle::widest];
-    basis[0] = 1.0;
-    for (int32_t j = 1; j <= degree; ++j) {
-        left[j] = x - knots[span + 1 - j];
-        right[j] = knots[span + j] - x;
-        double carried = 0.0;
-        for (int32_t r = 0; r < j; ++r) {
-            const double share = basis[r] / (right[r + 1] + left[j - r]);
-            basis[r] = carried + right[r + 1] * share;
-            carried = left[j - r] * share;
-        }
-        basis[j] = carried;
+// The upper triangle of a banded matrix with `band` diagonals and the target of each row.
+class BandedTriangle {
+public:
+    BandedTriangle(DBL *elements, int32_t order, int32_t band)
+        : elements_(elements), order_(order), band_(band) {
+        std::fill(row(0), row(0) + std::ptrdiff_t{order} * (band + 1), 0.0);
+    }
+    // Element (i, i + j), j < band; at j = band the target.
+    DBL *row(int32_t i) const { return elements_ + std::ptrdiff_t{i} * (band_ + 1); }
+    // No diagonal element is negligible beside its column.
+    bool hasFullRank() const;
+    void solve(DBL *x) const;
+
+private:
+    DBL *elements_;
+    int32_t order_, band_;
+};
+
+bool BandedTriangle::hasFullRank() const {
+    for (int32_t j = 0; j < order_; ++j) {
+        double largest = 0.0;
+        for (int32_t k = 0; k < band_ && k <= j; ++k)
+            largest = std::max(largest, std::fabs(row(j - k)[k]));
+        if (!(std::fabs(row(j)[0]) > 16 * kEpsilon * largest))
+            return false;
+    }
+    return true;
+}
+
+void BandedTriangle::solve(DBL *x) const {
+    for (int32_t i = order_ - 1; i >= 0; --i) {
+        const DBL *const r = row(i);
+        double rest = r[band_];
+        for (int32_t j = 1; j < band_ && j < order_ - i; ++j)
+            rest -= r[j] * x[i + j];
+        x[i] = rest / r[0];
     }
 }
 
-// The span of each x in turn, which ascend; the last x belongs to the last span that has a length.
+// The samples, which ascend, in runs within one span; the last x belongs to the last span that has
+// a length.
 class Spans {
 public:
-    Spans(const DBL *knots, int32_t degree, int32_t count)
-        : knots_(knots), span_(degree), last_(count - 1) {
+    Spans(const SpanSamples &all, const DBL *knots, int32_t degree, int32_t count)
+        : all_(all), knots_(knots), span_(degree), last_(count - 1) {
         while (last_ > degree && !(knots[last_] < knots[last_ + 1]))
             --last_;
     }
-    int32_t of(double x) {
-        while (span_ < last_ && !(x < knots_[span_ + 1]))
+    // The next run, of at most kSplineRows samples; false behind the last one.
+    bool next(SpanSamples *run) {
+        first_ += count_;
+        if (first_ >= all_.count)
+            return false;
+        while (span_ < last_ && !(all_.x[first_] < knots_[span_ + 1]))
             ++span_;
-        return span_;
+        const int32_t most = std::min(kSplineRows, all_.count - first_);
+        const DBL *const x = all_.x + first_;
+        count_ = span_ == last_ ? most : 1;
+        while (count_ < most && x[count_] < knots_[span_ + 1])
+            ++count_;
+        *run = {x, all_.y + first_, all_.w == nullptr ? nullptr : all_.w + first_, count_};
+        return true;
     }
+    int32_t first() const { return first_; }
+    int32_t span() const { return span_; }
 
 private:
+    const SpanSamples all_;
     const DBL *knots_;
-    int32_t span_, last_;
+    int32_t span_, last_, first_ = 0, count_ = 0;
 };
+
+// A power of two near 1 / sqrt(largest |w|), with which no square of a row leaves the range.
+double ScaleOfWeights(const DBL *w, int32_t n) {
+    const double largest = w == nullptr ? 1.0 : LargestWeight(w, n);
+    int exponent;
+    std::frexp(largest == 0.0 ? 1.0 : std::sqrt(largest), &exponent);
+    return std::ldexp(1.0, -exponent);
+}
 
 } // namespace
 
@@ -60,7 +106,7 @@ void MakeKnots(const DBL *x, int32_t n, int32_t degree, int32_t interior, const 
         const double position = (i + 1.0) * (n - 1.0) / (interior + 1.0);
         const auto below = std::min(static_cast<int32_t>(position), n - 2);
         const double share = position - below;
-        inner[i] = x[below] * (1.0 - share) + x[below + 1] * share;
+        inner[i] = std::min(x[below] + share * (x[below + 1] - x[below]), x[below + 1]);
     }
     std::fill(inner + interior, inner + interior + degree + 1, x[n - 1]);
 }
@@ -69,37 +115,26 @@ ErrorCode FitBSpline(const DBL *x, const DBL *y, const DBL *w, int32_t n, int32_
                      const DBL *knots, int32_t count, DBL *coefficients, DBL *values, DBL *mse) {
     if (!(x[0] < x[n - 1]))
         return ErrPolynomialOrderTooHigh;
-    BandedTriangle triangle;
-    if (const ErrorCode failed = triangle.make(count, degree + 1))
+    const int32_t stride = degree + 2;
+    Scratch<ElementType::DBL> memory; // the triangle, and a block of rows by columns
+    if (const ErrorCode failed = memory.allocate((int64_t{count} + kSplineRows) * stride))
         return failed;
-    triangle.clear();
-    double basis[BandedTriangle::widest];
-    Spans rows(knots, degree, count);
-    for (int32_t i = 0; i < n; ++i) {
-        const int32_t span = rows.of(x[i]);
-        BasisAt(x[i], knots, span, degree, basis);
-        const double root = w == nullptr ? 1.0 : std::sqrt(std::fabs(w[i]));
-        for (int32_t j = 0; j <= degree; ++j)
-            basis[j] *= root;
-        triangle.add(span - degree, basis, y[i] * root);
-    }
+    const BandedTriangle triangle(memory.data(), count, degree + 1);
+    const SpanSamples all = {x, y, w, n};
+    const double scale = ScaleOfWeights(w, n);
+    SpanSamples run;
+    for (Spans spans(all, knots, degree, count); spans.next(&run);)
+        ReduceSpan(&run, knots + spans.span(), degree, scale, triangle.row(spans.span() - degree),
+                   triangle.row(count));
     if (!triangle.hasFullRank())
         return ErrPolynomialOrderTooHigh;
     triangle.solve(coefficients);
 
-    double squares = 0.0;
-    Spans spans(knots, degree, count);
-    for (int32_t i = 0; i < n; ++i) {
-        const int32_t span = spans.of(x[i]);
-        BasisAt(x[i], knots, span, degree, basis);
-        double value = 0.0;
-        for (int32_t j = 0; j <= degree; ++j)
-            value += basis[j] * coefficients[span - degree + j];
-        const double rest = y[i] - value;
-        squares += (w == nullptr ? 1.0 : std::fabs(w[i])) * (rest * rest);
-        values[i] = value;
-    }
-    *mse = squares / n;
+    double squares[4] = {};
+    for (Spans spans(all, knots, degree, count); spans.next(&run);)
+        EvaluateSpan(&run, knots + spans.span(), degree, coefficients + spans.span() - degree,
+                     values + spans.first(), squares);
+    *mse = ((squares[0] + squares[1]) + (squares[2] + squares[3])) / n;
     return 0;
 }
 

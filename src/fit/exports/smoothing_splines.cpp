@@ -1,6 +1,7 @@
 #include "qx/smoothing_splines.h"
 
 #include "fit/b_spline.h"
+#include "fit/b_spline_spans.h"
 #include "fit/exports/fit_arguments.h"
 #include "fit/smoothing_spline.h"
 #include "linalg/matrix.h"
@@ -91,7 +92,7 @@ Outcome FitSpline(In<DBL1D> x, In<DBL1D> y, In<DBL1D> w, int32_t degree, int32_t
     const int32_t n = x.size();
     if (const ErrorCode failed =
             FirstFailed({{y.size() != n || !WeightsFit(w, n), ErrSizeMismatch},
-                         {degree < 1 || degree >= BandedTriangle::widest, ErrOrderNotPositive},
+                         {degree < 1 || degree > kHighestSplineDegree, ErrOrderNotPositive},
                          {interior < 0, ErrNegativeCount},
                          {!IsFinite(x) || !IsFinite(y) || !IsFinite(w) || !IsFinite(given),
                           ErrNonFiniteInput}}))

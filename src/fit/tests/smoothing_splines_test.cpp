@@ -199,13 +199,14 @@ Fitted FitB(const Samples &x, const Samples &y, const Samples &w, int32_t degree
 }
 
 // The basis from its recursive definition, closed at the right end.
-double Basis(const Samples &t, std::size_t i, int degree, double x) {
+template <class T = double>
+T Basis(const Samples &t, std::size_t i, int degree, T x) {
     if (degree == 0)
         return (t[i] <= x && x < t[i + 1]) ||
                (x == t.back() && t[i] < t[i + 1] && t[i + 1] == t.back());
-    const double left = t[i + degree] - t[i], right = t[i + degree + 1] - t[i + 1];
-    return (left > 0 ? (x - t[i]) / left * Basis(t, i, degree - 1, x) : 0.0) +
-           (right > 0 ? (t[i + degree + 1] - x) / right * Basis(t, i + 1, degree - 1, x) : 0.0);
+    const T left = T{t[i + degree]} - t[i], right = T{t[i + degree + 1]} - t[i + 1];
+    return (left > 0 ? (x - t[i]) / left * Basis<T>(t, i, degree - 1, x) : T{0}) +
+           (right > 0 ? (t[i + degree + 1] - x) / right * Basis<T>(t, i + 1, degree - 1, x) : T{0});
 }
 
 TEST(SmoothingSplines, LeastSquaresInTheirDefinition) {
@@ -236,6 +237,60 @@ TEST(SmoothingSplines, LeastSquaresInTheirDefinition) {
                 EXPECT_NEAR(found.knots[degree + 1], data.x[15] * 0.2 + data.x[16] * 0.8, 1e-14);
             }
         }
+}
+
+// What least squares leaves is orthogonal to each column, to the rounding errors of the columns and
+// y, wherever the knots lie; normal equations would fail here by the condition.
+TEST(SmoothingSplines, ResidualsAreOrthogonalForAnyKnots) {
+    Noise noise(7);
+    Samples x, y, w;
+    for (int i = 0; i < 600; ++i) {
+        x.push_back(noise.positive() * (i % 3 == 0 ? 1.0 : 1e-5));
+        w.push_back(std::pow(10.0, 6.0 * noise.symmetric()));
+    }
+    std::sort(x.begin(), x.end());
+    for (const double at : x)
+        y.push_back(1e3 + std::sin(9.0 * at) + noise.symmetric());
+    const Samples narrow = {2e-6, 3e-6, 4e-6, 4e-6 + 1e-12, 8e-6, 0.4, 0.4 + 1e-9, 0.4 + 2e-9, 0.7};
+    for (const int degree : {3, 6, 9})
+        for (const Samples &given : {narrow, Samples()}) {
+            const Fitted found = FitB(x, y, w, degree, 40, given);
+            ASSERT_EQ(found.code, 0) << degree;
+            const std::size_t count = found.c.size();
+            std::vector<Long> product(count), squares(count);
+            Long all = 0;
+            for (std::size_t i = 0; i < x.size(); ++i) {
+                std::vector<Long> row;
+                Long rest = y[i];
+                for (std::size_t j = 0; j < count; ++j) {
+                    row.push_back(Basis<Long>(found.knots, j, degree, x[i]));
+                    rest -= row[j] * found.c[j];
+                }
+                const Long weight = std::fabs(w[i]);
+                all += weight * y[i] * y[i];
+                for (std::size_t j = 0; j < count; ++j) {
+                    product[j] += weight * row[j] * rest;
+                    squares[j] += weight * row[j] * row[j];
+                }
+            }
+            for (std::size_t j = 0; j < count; ++j)
+                EXPECT_LT(std::fabs(product[j]), 6 * 0x1p-52L * std::sqrt(squares[j] * all))
+                    << degree << ' ' << j;
+        }
+}
+
+// Quantiles among equal x are that x to the bit.
+TEST(SmoothingSplines, KnotsAmongEqualSamples) {
+    Samples x(300), y(300);
+    for (int i = 0; i < 300; ++i) {
+        x[i] = 0.06 * (1 + i / 30);
+        y[i] = i % 7;
+    }
+    const Fitted found = FitB(x, y, {}, 1, 5);
+    ASSERT_EQ(found.code, 0);
+    for (const int i : {2, 3, 5, 6})
+        EXPECT_TRUE(std::find(x.begin(), x.end(), found.knots[i]) != x.end()) << i;
+    EXPECT_NEAR(found.knots[4], (x[149] + x[150]) / 2, 1e-15);
 }
 
 TEST(SmoothingSplines, CodesInTheirOrder) {
