@@ -15,14 +15,18 @@ QX_BEGIN_DECLS
     by generalised cross validation, to some 5 digits (parameter is not used); 1 lambda is
     `parameter`; 2 the smoothest spline with a sum of squares of at most `parameter`. values and
     secondDerivatives are at each x; row i of `coefficients`, n - 1 by 4, has the ascending powers
-   of x - x[i] between x[i] and x[i + 1]. *effectiveParameters is the trace of the matrix from y to
+    of x - x[i] between x[i] and x[i + 1]. *effectiveParameters is the trace of the matrix from y to
     the values. lambda 0 interpolates. One sample gives a constant, two give a line, with lambda 0;
-    where the line is the result of method 0 or 2 *lambda is infinite. Method 0 looks from 1e-6 to
-    100 n^4, in units of the cube of the mean spacing over the square of the largest deviation, so
-   it does not find smaller ones for samples far closer than the mean. Sources: C. H. Reinsch,
-   Smoothing by spline functions, 1967; P. Craven, G. Wahba, Smoothing noisy data with spline
-   functions, 1979; M. F. Hutchinson, F. R. de Hoog, Smoothing noisy data with spline functions,
-   1985. Codes: ErrEmptyInput (x or y is empty), ErrSizeMismatch (x, y and deviations differ in
+    where the line is the result of method 0 or 2 *lambda is infinite, so it is for method 0 where
+    no score is below the line's by more than 1e-7 of it. Method 0 looks from 1e-6 to 100 n^4, in
+    units of the cube of the mean spacing over the square of the largest deviation, so it does not
+    find smaller ones for samples far closer than the mean, and may miss the lowest of several
+    minima. The sum of squares carries the rounding errors of y: a `parameter` of method 2 below
+    these gives lambda 0 or a lambda without digits. Sources: C. H. Reinsch, Smoothing by spline
+    functions, 1967; P. Craven, G. Wahba, Smoothing noisy data with spline functions, 1979; G.
+    Wahba, Improper priors, spline smoothing and the problem of guarding against model errors in
+    regression, 1978; G. J. Bierman, Factorization Methods for Discrete Sequential Estimation, 1977.
+    Codes: ErrEmptyInput (x or y is empty), ErrSizeMismatch (x, y and deviations differ in
    length), ErrInvalidSelector (method), ErrNonFiniteInput (an array or parameter),
    ErrNotStrictlyPositive (a deviation), ErrNegativeSetting (parameter of methods 1 and 2 below 0 or
    NaN), ErrAbscissaeOrder (x does not ascend), ErrOutOfMemory (no memory, or an array cannot be

@@ -7,6 +7,77 @@
 
 namespace qx {
 
+// What the pass forwards leaves of the interval from sample i to i + 1 for that backwards: with the
+// value g and the slope s at i + 1,
+//     u1 = t1 - a1 g - a2 s + noise of variance v1,   s of sample i: s - u1,
+//     u2 = t2 - q u1 - b1 g - b2 s + noise of v2,     g of sample i: g - h s + h/2 u1 + h/sqrt(12) u2.
+// The mean of s'' is u1 / h, and half of its growth is sqrt(3) u2 / h.
+struct SmoothingSpline::Step {
+    DBL t1, a1, a2, v1;
+    DBL t2, q, b1, b2, v2;
+};
+
+// (r11 r12; 0 r22) (g, s) = (z1, z2).
+struct SmoothingSpline::Triangle {
+    double r11, r12, r22, z1, z2;
+};
+
+namespace {
+
+constexpr double rootOf3 = 0x1.bb67ae8584caap+0, rootOf12 = 0x1.bb67ae8584caap+1;
+
+// Rotates b into a: (a, b) becomes (length, 0).
+struct Turn {
+    double c = 1.0, s = 0.0;
+    Turn(double *a, double b) {
+        if (b == 0.0)
+            return;
+        const double length = std::sqrt(*a * *a + b * b), inverse = 1.0 / length;
+        c = *a * inverse;
+        s = b * inverse;
+        *a = length;
+    }
+    void apply(double *a, double *b) const {
+        const double before = *a;
+        *a = c * before + s * *b;
+        *b = c * *b - s * before;
+    }
+};
+
+// Where the growing f, above 0 at high and not at low, has its zero: the last x found, to 1e-13 of x
+// or of 1, with f not above 0 (T. R. Chandrupatla, A new hybrid quadratic/bisection algorithm for
+// finding the zero of a nonlinear function without using derivatives, 1997).
+template <class Function>
+double LastNotAbove(const Function &f, double low, double atLow, double high, double atHigh) {
+    double newest = low, atNewest = atLow, other = high, atOther = atHigh, share = 0.5;
+    for (;;) {
+        const double x = newest + share * (other - newest), at = f(x);
+        double third = newest, atThird = atNewest;
+        if ((at > 0.0) != (atNewest > 0.0)) {
+            third = other;
+            atThird = atOther;
+            other = newest;
+            atOther = atNewest;
+        }
+        newest = x;
+        atNewest = at;
+        const double width = std::fabs(other - newest), tolerance = 1e-13 * (1.0 + std::fabs(x));
+        if (!(width > tolerance))
+            return atNewest > 0.0 ? other : newest;
+        const double xi = (newest - other) / (third - other);
+        const double phi = (atNewest - atOther) / (atThird - atOther);
+        share = 0.5;
+        if (phi * phi < xi && (1.0 - phi) * (1.0 - phi) < 1.0 - xi)
+            share = atNewest / (atOther - atNewest) * (atThird / (atOther - atThird)) +
+                    (third - newest) / (other - newest) * (atNewest / (atThird - atNewest)) *
+                        (atOther / (atThird - atOther));
+        const double least = 0.5 * tolerance / width;
+        share = std::min(std::max(share, least), 1.0 - least);
+    }
+}
+
+} // namespace
+
 ErrorCode SmoothingSpline::make(const DBL *x, const DBL *y, const DBL *d, int32_t n) {
     x_ = x;
     y_ = y;
@@ -14,202 +85,259 @@ ErrorCode SmoothingSpline::make(const DBL *x, const DBL *y, const DBL *d, int32_
     n_ = n;
     unitOfX_ = (x[n - 1] - x[0]) / (n - 1);
     unitOfD_ = d == nullptr ? 1.0 : *std::max_element(d, d + n);
-    if (const ErrorCode failed = v_.allocate(n - 2))
+    constexpr int64_t elements = sizeof(Step) / sizeof(DBL);
+    if (const ErrorCode failed = rest_.allocate(n))
         return failed;
-    return triangle_.make(n - 2, 3);
-}
-
-// Row i of D Q: its elements in the columns i - 2, i - 1 and i, 0 where there is no column.
-void SmoothingSpline::differences(int32_t i, DBL *q) const {
-    const double d = deviation(i);
-    q[0] = i > 1 ? d / spacing(i - 1) : 0.0;
-    q[1] = i > 0 && i < n_ - 1 ? -d * (1.0 / spacing(i - 1) + 1.0 / spacing(i)) : 0.0;
-    q[2] = i < n_ - 2 ? d / spacing(i) : 0.0;
-}
-
-// The triangle of [alpha D Q; beta L'] with (beta / alpha)^2 = 1 / lambda and the larger one 1; an
-// alpha of 0 is the interpolating spline.
-void SmoothingSpline::factor(double lambda) {
-    const int32_t m = n_ - 2;
-    const double root = std::sqrt(lambda);
-    const double beta = root > 1.0 ? 1.0 / root : 1.0;
-    alpha_ = root > 1.0 ? 1.0 : root;
-    triangle_.clear();
-    double carried = 0.0; // the element of L below the last diagonal one
-    for (int32_t i = 0; i < n_; ++i) {
-        double q[3], moved[3] = {};
-        differences(i, q);
-        const int32_t first = std::max(0, i - 2), skipped = first - (i - 2);
-        for (int32_t j = skipped; j < 3; ++j)
-            moved[j - skipped] = alpha_ * q[j];
-        if (alpha_ != 0.0)
-            triangle_.add(first, moved, alpha_ * y_[i] / deviation(i));
-        if (i < 2)
-            continue;
-        const int32_t j = i - 2;
-        const double diagonal = std::sqrt((spacing(j) + spacing(j + 1)) / 3.0 - carried * carried);
-        carried = j + 1 < m ? spacing(j + 1) / 6.0 / diagonal : 0.0;
-        const double row[3] = {beta * diagonal, beta * carried, 0.0};
-        triangle_.add(j, row, 0.0);
-    }
-}
-
-// values = y - D^2 Q v; returns the sum of ((y - values) / d)^2 in units of d.
-double SmoothingSpline::residuals(DBL *values) {
-    double squares = 0.0;
-    for (int32_t i = 0; i < n_; ++i) {
-        double q[3], u = 0.0;
-        differences(i, q);
-        for (int32_t j = 0; j < 3; ++j)
-            u += q[j] == 0.0 ? 0.0 : q[j] * v_[i - 2 + j];
-        squares += u * u;
-        values[i] = y_[i] - deviation(i) * u;
-    }
-    return squares;
-}
-
-double SmoothingSpline::solve(double lambda, DBL *values) {
-    factor(lambda);
-    triangle_.solve(v_.data());
-    return residuals(values);
-}
-
-// The trace of I - A = alpha^2 D Q S Q' D with S the inverse of the triangle's square. S is walked
-// from its end; s00 is its element (j, j), s12 (j + 1, j + 2), and so on. Sample j + 2 is complete
-// with column j.
-double SmoothingSpline::traceOfRest() const {
-    double trace = 0.0;
-    double s11 = 0.0, s12 = 0.0, s22 = 0.0;
-    for (int32_t j = n_ - 3; j >= -2; --j) {
-        double s00 = 0.0, s01 = 0.0, s02 = 0.0;
-        if (j >= 0) {
-            const DBL *const r = triangle_.row(j);
-            const double a = r[1] / r[0], b = r[2] / r[0];
-            s02 = -(a * s12 + b * s22);
-            s01 = -(a * s11 + b * s12);
-            s00 = 1.0 / (r[0] * r[0]) - (a * s01 + b * s02);
-        }
-        double q[3];
-        differences(j + 2, q);
-        const double form = q[0] * (q[0] * s00 + 2.0 * (q[1] * s01 + q[2] * s02)) +
-                            q[1] * (q[1] * s11 + 2.0 * q[2] * s12) + q[2] * q[2] * s22;
-        trace += form;
-        s22 = s11;
-        s12 = s01;
-        s11 = s00;
-    }
-    return alpha_ * alpha_ * trace;
-}
-
-// The score of generalised cross validation (P. Craven, G. Wahba, Smoothing noisy data with spline
-// functions, 1979), less a factor of n.
-double SmoothingSpline::score(double logLambda, DBL *values) {
-    const double squares = solve(std::exp(logLambda), values);
-    const double rest = traceOfRest();
-    return squares / (rest * rest);
+    if (const ErrorCode failed = steps_.allocate(elements * (n - 1)))
+        return failed;
+    takeOffLine();
+    return 0;
 }
 
 // The weighted line, with x and y about their weighted means.
-void SmoothingSpline::line(DBL *values, double *squares) const {
-    double sum = 0.0, meanX = 0.0, meanY = 0.0;
+void SmoothingSpline::takeOffLine() {
+    double sum = 0.0;
     for (int32_t i = 0; i < n_; ++i) {
         const double weight = 1.0 / (deviation(i) * deviation(i));
         sum += weight;
-        meanX += ((x_[i] - x_[0]) / unitOfX_ - meanX) * (weight / sum);
-        meanY += (y_[i] - meanY) * (weight / sum);
+        meanX_ += ((x_[i] - x_[0]) / unitOfX_ - meanX_) * (weight / sum);
+        meanY_ += (y_[i] - meanY_) * (weight / sum);
     }
     double xx = 0.0, xy = 0.0;
     for (int32_t i = 0; i < n_; ++i) {
         const double weight = 1.0 / (deviation(i) * deviation(i));
-        const double x = (x_[i] - x_[0]) / unitOfX_ - meanX;
+        const double x = (x_[i] - x_[0]) / unitOfX_ - meanX_;
         xx += weight * x * x;
-        xy += weight * x * (y_[i] - meanY);
+        xy += weight * x * (y_[i] - meanY_);
     }
-    const double slope = xy / xx;
-    *squares = 0.0;
+    slope_ = xy / xx;
     for (int32_t i = 0; i < n_; ++i) {
-        values[i] = meanY + slope * ((x_[i] - x_[0]) / unitOfX_ - meanX);
-        const double u = (y_[i] - values[i]) / deviation(i);
-        *squares += u * u;
+        rest_[i] = y_[i] - onLine(i);
+        const double u = rest_[i] / deviation(i);
+        lineSquares_ += u * u;
     }
 }
 
-// The spline through the samples: L L' s'' = Q' y, with L' in the triangle.
-void SmoothingSpline::interpolate(DBL *second) {
-    const int32_t m = n_ - 2;
-    factor(0.0);
-    double before = 0.0;
-    for (int32_t j = 0; j < m; ++j) {
-        const double right =
-            (y_[j + 2] - y_[j + 1]) / spacing(j + 1) - (y_[j + 1] - y_[j]) / spacing(j);
-        DBL *const r = triangle_.row(j);
-        before = r[3] = (right - (j > 0 ? triangle_.row(j - 1)[1] * before : 0.0)) / r[0];
+// The rows are sample i: (1 / d) g = y / d, and step i: u sqrt(lambda) = 0, where the state i is
+// written by u and the state i + 1. Returns the triangle of the last sample.
+SmoothingSpline::Triangle SmoothingSpline::forwards(double lambda) {
+    auto *const steps = reinterpret_cast<Step *>(steps_.data());
+    const double rootOfLambda = std::sqrt(lambda);
+    Triangle r = {1.0 / deviation(0), 0.0, 0.0, rest_[0] / deviation(0), 0.0};
+    for (int32_t i = 0; i < n_ - 1; ++i) {
+        const double h = spacing(i), gamma = std::sqrt(h) / rootOfLambda;
+        // Rows (u1, u2 | g, s | z): the triangle's become (e1, e2 | r11, r12 | z1) and (e3, 0 | 0,
+        // r22 | z2); the columns of u in units of gamma.
+        double e1 = gamma * (0.5 * h * r.r11 - r.r12), e3 = -gamma * r.r22;
+        const double e2 = gamma * (h / rootOf12) * r.r11;
+        r.r12 -= h * r.r11;
+
+        double length = 1.0;
+        const Turn second(&length, e2);
+        const double share = second.s / length;
+        Step &step = steps[i];
+        step.t2 = gamma * share * r.z1;
+        step.q = share * e1;
+        step.b1 = gamma * share * r.r11;
+        step.b2 = gamma * share * r.r12;
+        step.v2 = (gamma / length) * (gamma / length);
+        for (double *const element : {&e1, &r.r11, &r.r12, &r.z1})
+            *element *= second.c;
+
+        double r21 = 0.0, a1 = 0.0, a2 = 0.0, t1 = 0.0;
+        length = 1.0;
+        const Turn first(&length, e1);
+        first.apply(&a1, &r.r11);
+        first.apply(&a2, &r.r12);
+        first.apply(&t1, &r.z1);
+        const Turn third(&length, e3);
+        third.apply(&a1, &r21);
+        third.apply(&a2, &r.r22);
+        third.apply(&t1, &r.z2);
+        const double scale = gamma / length;
+        step.t1 = scale * t1;
+        step.a1 = scale * a1;
+        step.a2 = scale * a2;
+        step.v1 = scale * scale;
+
+        // Sample i + 1, and the triangle again.
+        const double weight = 1.0 / deviation(i + 1);
+        double fill = 0.0, z3 = weight * rest_[i + 1];
+        const Turn sample(&r.r11, weight);
+        sample.apply(&r.r12, &fill);
+        sample.apply(&r.z1, &z3);
+        const Turn below(&r.r11, r21);
+        below.apply(&r.r12, &r.r22);
+        below.apply(&r.z1, &r.z2);
+        const Turn corner(&r.r22, fill);
+        corner.apply(&r.z2, &z3);
     }
-    triangle_.solve(second);
+    return r;
+}
+
+// second: in units of the mean spacing, 0 at both ends.
+SmoothingSpline::Quality SmoothingSpline::backwards(const Triangle &last, DBL *values,
+                                                    DBL *second) const {
+    const auto *const steps = reinterpret_cast<const Step *>(steps_.data());
+    double s = last.z2 / last.r22, g = (last.z1 - last.r12 * s) / last.r11;
+    // The variances of g and s and their covariance.
+    double vss = 1.0 / (last.r22 * last.r22);
+    double vgs = -last.r12 / last.r11 * vss;
+    double vgg = 1.0 / (last.r11 * last.r11) - last.r12 / last.r11 * vgs;
+    Quality quality = {0.0, 0.0};
+    for (int32_t i = n_ - 1;; --i) {
+        const double weight = 1.0 / deviation(i), u = weight * (rest_[i] - g);
+        quality.squares += u * u;
+        // The variance is at most that of the sample alone; rounding lifts it where weights or steps
+        // differ by more than the digits.
+        quality.effective += std::min(1.0, weight * weight * vgg);
+        values[i] = g;
+        if (i == 0)
+            break;
+        const Step &step = steps[i - 1];
+        const double h = spacing(i - 1), k = h / rootOf12, m = 0.5 * h - k * step.q;
+        const double u1 = step.t1 - step.a1 * g - step.a2 * s;
+        const double u2 = step.t2 - step.q * u1 - step.b1 * g - step.b2 * s;
+        second[i - 1] = (u1 - rootOf3 * u2) / h;
+        g = g - h * s + (0.5 * h * u1 + k * u2);
+        s = s - u1;
+
+        const double gg = 1.0 - k * step.b1 - m * step.a1, gs = -(h + k * step.b2 + m * step.a2);
+        const double sg = step.a1, ss = 1.0 + step.a2;
+        const double g0 = gg * vgg + gs * vgs, g1 = gg * vgs + gs * vss;
+        const double s0 = sg * vgg + ss * vgs, s1 = sg * vgs + ss * vss;
+        vgg = (gg * g0 + gs * g1) + (m * m * step.v1 + k * k * step.v2);
+        vgs = (gg * s0 + gs * s1) - m * step.v1;
+        vss = (sg * s0 + ss * s1) + step.v1;
+    }
+    second[0] = second[n_ - 1] = 0.0;
+    return quality;
+}
+
+SmoothingSpline::Quality SmoothingSpline::solve(double lambda, DBL *values, DBL *second) {
+    return backwards(forwards(lambda), values, second);
+}
+
+// The score of generalised cross validation (P. Craven, G. Wahba, Smoothing noisy data with spline
+// functions, 1979), less a factor of n.
+double SmoothingSpline::score(double logLambda, DBL *values, DBL *second) {
+    const Quality found = solve(std::exp(logLambda), values, second);
+    const double rest = n_ - found.effective;
+    return found.squares / (rest * rest);
+}
+
+// The spline through the samples: R s'' = Q' y, tridiagonal, by elimination.
+void SmoothingSpline::interpolate(DBL *second) {
+    DBL *const above = rest_.data();
+    double before = 0.0, slope = (y_[1] - y_[0]) / spacing(0);
+    above[0] = second[0] = 0.0;
+    for (int32_t i = 1; i < n_ - 1; ++i) {
+        const double h = spacing(i - 1), next = spacing(i);
+        const double slopeBefore = slope;
+        slope = (y_[i + 1] - y_[i]) / next;
+        const double diagonal = 2.0 * (h + next) - h * above[i - 1];
+        above[i] = next / diagonal;
+        before = second[i] = (6.0 * (slope - slopeBefore) - h * before) / diagonal;
+    }
+    second[n_ - 1] = 0.0;
+    for (int32_t i = n_ - 2; i > 0; --i)
+        second[i] -= above[i] * second[i + 1];
+}
+
+// The lowest score between low and high, to 1e-5 beside `middle`, whose score is below both ends':
+// parabolas, and the golden section where these do not converge (R. P. Brent, Algorithms for
+// Minimization Without Derivatives, 1973).
+double SmoothingSpline::leastScore(double low, double middle, double high, DBL *values, DBL *second,
+                                   double *at) {
+    constexpr double golden = 0x1.8722191a02d61p-2, tolerance = 2.5e-6;
+    double best = middle, next = middle, old = middle; // the lowest three scores so far
+    double atBest = score(best, values, second), atNext = atBest, atOld = atBest;
+    double step = 0.0, stepBefore = 0.0;
+    while (std::fabs(best - 0.5 * (low + high)) + 0.5 * (high - low) > 2.0 * tolerance) {
+        const double centre = 0.5 * (low + high);
+        const double r = (best - next) * (atBest - atOld), t = (best - old) * (atBest - atNext);
+        const double above = (best - old) * t - (best - next) * r, below = 2.0 * (t - r);
+        const double parabola = -above / below, twoBefore = stepBefore;
+        stepBefore = step;
+        if (std::fabs(parabola) < 0.5 * std::fabs(twoBefore) && best + parabola > low &&
+            best + parabola < high) {
+            step = parabola;
+            if (best + step - low < 2.0 * tolerance || high - best - step < 2.0 * tolerance)
+                step = std::copysign(tolerance, centre - best);
+        } else {
+            stepBefore = best < centre ? high - best : low - best;
+            step = golden * stepBefore;
+        }
+        const double to =
+            best + (std::fabs(step) < tolerance ? std::copysign(tolerance, step) : step);
+        const double atTo = score(to, values, second);
+        if (atTo <= atBest) {
+            (to < best ? high : low) = best;
+            old = next, atOld = atNext;
+            next = best, atNext = atBest;
+            best = to, atBest = atTo;
+            continue;
+        }
+        (to < best ? low : high) = to;
+        if (atTo <= atNext || next == best) {
+            old = next, atOld = atNext;
+            next = to, atNext = atTo;
+        } else if (atTo <= atOld || old == best || old == next) {
+            old = to, atOld = atTo;
+        }
+    }
+    *at = best;
+    return atBest;
 }
 
 // A walk by factors of 10 from where the spline follows each sample to where it is nearly the line,
-// then the golden section about the lowest score; infinite where no score is below the line's.
-double SmoothingSpline::crossValidated(DBL *values) {
-    constexpr double golden = 0x1.3c6ef372fe95p-1, decade = 0x1.26bb1bbb55516p+1;
+// then the minimum about the lowest score; infinite where no score is below the line's.
+double SmoothingSpline::crossValidated(DBL *values, DBL *second) {
+    constexpr double decade = 0x1.26bb1bbb55516p+1;
     const auto decades = static_cast<int32_t>(4.0 * std::log10(n_)) + 2;
-    double lineSquares;
-    line(values, &lineSquares);
-    double best = kInfinity, bestAt = 0.0;
+    double least = kInfinity, at = 0.0;
     for (int32_t i = -6; i <= decades; ++i) {
-        const double found = score(i * decade, values);
-        if (found < best) {
-            best = found;
-            bestAt = i * decade;
+        const double found = score(i * decade, values, second);
+        if (found < least) {
+            least = found;
+            at = i * decade;
         }
     }
-    double low = bestAt - decade, high = bestAt + decade;
-    double left = high - golden * (high - low), right = low + golden * (high - low);
-    double atLeft = score(left, values), atRight = score(right, values);
-    while (high - low > 1e-5) {
-        if (atLeft <= atRight) {
-            high = right;
-            right = left;
-            atRight = atLeft;
-            left = high - golden * (high - low);
-            atLeft = score(left, values);
-        } else {
-            low = left;
-            left = right;
-            atLeft = atRight;
-            right = low + golden * (high - low);
-            atRight = score(right, values);
-        }
-    }
+    least = leastScore(at - decade, at, at + decade, values, second, &at);
+    constexpr double clearly = 1.0 - 1e-7; // below the rounding errors of the scores
     const double freedom = n_ - 2.0;
-    const bool isLine = !(std::min(atLeft, atRight) < lineSquares / (freedom * freedom));
-    return isLine ? kInfinity : std::exp((low + high) / 2);
+    return least < clearly * (lineSquares_ / (freedom * freedom)) ? std::exp(at) : kInfinity;
 }
 
-// The lambda at which the squares are `wanted`, by bisection of its logarithm between values that
-// enclose it; 0 where that is beyond the numbers.
-double SmoothingSpline::within(double wanted, DBL *values) {
-    double lineSquares;
-    line(values, &lineSquares);
-    if (wanted >= lineSquares)
+// The largest lambda at which the squares are at most `wanted`, to 1e-13 of its logarithm or of 1;
+// 0 where that is beyond the numbers.
+double SmoothingSpline::within(double wanted, DBL *values, DBL *second) {
+    if (wanted >= lineSquares_)
         return kInfinity;
-    constexpr double step = 7.0, furthest = 600.0;
-    double low = 0.0, high = 0.0;
-    while (low > -furthest && solve(std::exp(low), values) > wanted) {
+    const auto excess = [&](double logLambda) {
+        return std::log(solve(std::exp(logLambda), values, second).squares / wanted);
+    };
+    constexpr double furthest = 600.0;
+    double step = 7.0, low = 0.0, atLow = excess(low), high = low, atHigh = atLow;
+    while (atLow > 0.0 && low > -furthest) {
         high = low;
-        low -= step;
+        atHigh = atLow;
+        low = std::max(low - step, -furthest);
+        atLow = excess(low);
+        step *= 2.0;
     }
-    while (high < furthest && (high <= low || solve(std::exp(high), values) <= wanted)) {
-        low = high > low ? high : low;
-        high = std::max(high, low) + step;
-    }
-    if (wanted == 0.0 || low <= -furthest)
+    if (atLow > 0.0)
         return 0.0;
-    while (high - low > 1e-13 * (1.0 + std::fabs(low))) {
-        const double middle = 0.5 * (low + high);
-        (solve(std::exp(middle), values) <= wanted ? low : high) = middle;
+    while (!(atHigh > 0.0) && high < furthest) {
+        low = high;
+        atLow = atHigh;
+        high = std::min(high + step, furthest);
+        atHigh = excess(high);
+        step *= 2.0;
     }
-    return std::exp(low);
+    if (!(atHigh > 0.0))
+        return kInfinity;
+    return std::exp(LastNotAbove(excess, low, atLow, high, atHigh));
 }
 
 void SmoothingSpline::fit(Smoothing method, double parameter, DBL *values, DBL *second, DBL *lambda,
@@ -217,30 +345,29 @@ void SmoothingSpline::fit(Smoothing method, double parameter, DBL *values, DBL *
     const double unit = unitOfD_ * unitOfD_ / (unitOfX_ * unitOfX_ * unitOfX_);
     double inside = parameter * unit;
     if (method == Smoothing::CrossValidated)
-        inside = crossValidated(values);
+        inside = crossValidated(values, second);
     else if (method == Smoothing::WithinSquares)
-        inside = parameter == 0.0 ? 0.0 : within(parameter * unitOfD_ * unitOfD_, values);
+        inside = parameter == 0.0 ? 0.0 : within(parameter * unitOfD_ * unitOfD_, values, second);
     *lambda = method == Smoothing::Given ? parameter : inside / unit;
-    std::fill(second, second + n_, 0.0);
     if (inside == kInfinity) {
-        double squares;
-        line(values, &squares);
+        std::fill(second, second + n_, 0.0);
+        for (int32_t i = 0; i < n_; ++i)
+            values[i] = onLine(i);
         *lambda = kInfinity;
         *effective = 2.0;
         return;
     }
     if (inside < 1e-280) {
-        interpolate(second + 1);
+        interpolate(second);
         std::copy(y_, y_ + n_, values);
         *effective = n_;
     } else {
-        solve(inside, values);
-        *effective = n_ - traceOfRest();
-        for (int32_t j = 0; j < n_ - 2; ++j)
-            second[j + 1] = v_[j] / inside;
+        *effective = solve(inside, values, second).effective;
+        for (int32_t i = 0; i < n_; ++i)
+            values[i] += onLine(i);
     }
-    for (int32_t j = 1; j < n_ - 1; ++j)
-        second[j] = second[j] / unitOfX_ / unitOfX_;
+    for (int32_t i = 1; i < n_ - 1; ++i)
+        second[i] = second[i] / unitOfX_ / unitOfX_;
 }
 
 } // namespace qx

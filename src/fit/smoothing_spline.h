@@ -1,7 +1,7 @@
 #ifndef QX_FIT_SMOOTHING_SPLINE_H
 #define QX_FIT_SMOOTHING_SPLINE_H
 
-#include "fit/banded_triangle.h"
+#include "frame/scratch.h"
 
 namespace qx {
 
@@ -9,40 +9,51 @@ enum class Smoothing : int32_t { CrossValidated = 0, Given = 1, WithinSquares = 
 
 // The natural cubic spline that minimises sum ((y - s) / d)^2 + lambda integral s''^2, n > 2.
 //
-// With C. H. Reinsch's matrices (Smoothing by spline functions, 1967), Q of second divided
-// differences and R = L L' of the integral, D = diag(d) and v = lambda s'', the residuals are
-// y - s = D^2 Q v, and v minimises |D Q v - D^-1 y|^2 + |L' v|^2 / lambda: a banded least-squares
-// problem, solved by rotations, so the condition of the normal equations is not squared. The trace
-// of I - A, where s = A y, comes from the central diagonals of the inverse (M. F. Hutchinson,
-// F. R. de Hoog, Smoothing noisy data with spline functions, 1985). x is in units of its mean
-// spacing and d in units of its largest inside.
+// Value and slope at a sample are the state of an integrated random walk, x[i + 1] = F x[i] + G u
+// with independent u of variance 1 / lambda, of which the spline is the smoothed path (G. Wahba,
+// Improper priors, spline smoothing and the problem of guarding against model errors in
+// regression, 1978). A pass forwards reduces the rows of samples and steps to triangles of order 2
+// by rotations (G. J. Bierman, Factorization Methods for Discrete Sequential Estimation, 1977), a
+// pass backwards gives the states, the second derivatives, which are the u, and the variances of
+// the values, of which the trace of the matrix from y to the values is the sum (the same in O(n) as
+// M. F. Hutchinson and F. R. de Hoog's, 1985, but a sum of positive terms, which keeps its digits
+// where samples lie close together). x is in units of its mean spacing, d in units of its largest,
+// and the weighted line is taken off y, which changes neither.
 class SmoothingSpline {
 public:
     // d may be null. The arrays must outlive this. ErrOutOfMemory.
     ErrorCode make(const DBL *x, const DBL *y, const DBL *d, int32_t n);
-    // values: n elements, also work until the end.
+    // values and second, n elements each, are also work until the end.
     void fit(Smoothing method, double parameter, DBL *values, DBL *second, DBL *lambda,
              DBL *effective);
 
 private:
+    // The sum of ((y - s) / d)^2 and the trace of the matrix from y to s.
+    struct Quality {
+        double squares, effective;
+    };
+    struct Step;
+    struct Triangle;
+
     double spacing(int32_t i) const { return (x_[i + 1] - x_[i]) / unitOfX_; }
     double deviation(int32_t i) const { return d_ == nullptr ? 1.0 : d_[i] / unitOfD_; }
-    void differences(int32_t i, DBL *q) const;
-    void factor(double lambda);
-    double residuals(DBL *values);
-    double traceOfRest() const;
-    double solve(double lambda, DBL *values);
-    double score(double logLambda, DBL *values);
-    void line(DBL *values, double *squares) const;
+    double onLine(int32_t i) const { return meanY_ + slope_ * ((x_[i] - x_[0]) / unitOfX_ - meanX_); }
+    void takeOffLine();
+    Triangle forwards(double lambda);
+    Quality backwards(const Triangle &last, DBL *values, DBL *second) const;
+    Quality solve(double lambda, DBL *values, DBL *second);
+    double score(double logLambda, DBL *values, DBL *second);
     void interpolate(DBL *second);
-    double crossValidated(DBL *values);
-    double within(double squares, DBL *values);
+    double crossValidated(DBL *values, DBL *second);
+    double leastScore(double low, double middle, double high, DBL *values, DBL *second, double *at);
+    double within(double squares, DBL *values, DBL *second);
 
     const DBL *x_ = nullptr, *y_ = nullptr, *d_ = nullptr;
     int32_t n_ = 0;
-    double unitOfX_ = 1.0, unitOfD_ = 1.0, alpha_ = 1.0;
-    BandedTriangle triangle_;
-    Scratch<ElementType::DBL> v_; // n - 2
+    double unitOfX_ = 1.0, unitOfD_ = 1.0;
+    double meanX_ = 0.0, meanY_ = 0.0, slope_ = 0.0, lineSquares_ = 0.0;
+    Scratch<ElementType::DBL> rest_;  // y less the line
+    Scratch<ElementType::DBL> steps_; // n - 1 of Step
 };
 
 } // namespace qx

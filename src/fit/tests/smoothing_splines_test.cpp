@@ -153,6 +153,70 @@ TEST(SmoothingSplines, SmoothestWithinASumOfSquares) {
                     1e-13);
 }
 
+// Samples that nearly coincide count as one of their mean with the weights added, and so does the
+// trace. Formulas with differences of neighbours lose all digits here.
+TEST(SmoothingSplines, CrowdedSamplesCountAsOne) {
+    Data merged = Noisy(60), crowded;
+    Noise noise(5);
+    for (std::size_t i = 0; i < merged.x.size(); ++i) {
+        const double d = merged.d[i], u = noise.symmetric();
+        for (const double side : {-1.0, 0.0, 1.0}) {
+            crowded.x.push_back(merged.x[i] + 1e-10 * side);
+            crowded.y.push_back(merged.y[i] + side * u);
+            crowded.d.push_back(d);
+        }
+        merged.d[i] = d / std::sqrt(3.0);
+    }
+    for (const double lambda : {1e-3, 1.0, 1e4, 1e8}) {
+        const Smoothed one = Smooth(merged.x, merged.y, merged.d, 1, lambda);
+        const Smoothed three = Smooth(crowded.x, crowded.y, crowded.d, 1, lambda);
+        EXPECT_NEAR(three.effective, one.effective, 1e-8) << lambda;
+        for (std::size_t i = 0; i < merged.x.size(); ++i) {
+            ASSERT_NEAR(three.values[3 * i + 1], one.values[i], 1e-9) << lambda;
+            ASSERT_NEAR(three.second[3 * i + 1], one.second[i], 1e-9 / lambda + 1e-10)
+                << lambda;
+        }
+    }
+}
+
+TEST(SmoothingSplines, CrossValidationOfSamplesAtRandom) {
+    Noise noise(9);
+    Data data;
+    for (int i = 0; i < 20000; ++i)
+        data.x.push_back(10.0 * noise.positive());
+    std::sort(data.x.begin(), data.x.end());
+    for (const double x : data.x)
+        data.y.push_back(std::sin(x) + noise.symmetric());
+    const Smoothed found = Smooth(data.x, data.y, {}, 0, 0);
+    ASSERT_EQ(found.code, 0);
+    EXPECT_GT(found.effective, 5.0);
+    EXPECT_LT(found.effective, 60.0);
+    double squares = 0.0;
+    for (std::size_t i = 0; i < data.x.size(); ++i)
+        squares += std::pow(found.values[i] - std::sin(data.x[i]), 2);
+    // Three times the share of the noise, of variance 1/3, that so many parameters take on.
+    EXPECT_LT(squares, found.effective);
+}
+
+// The score of three samples does not depend on lambda: it is that of the line.
+TEST(SmoothingSplines, CrossValidationOfThreeIsTheLine) {
+    EXPECT_EQ(Smooth({1, 2, 4}, {1, 5, 2}, {}, 0, 0).lambda, infinity);
+}
+
+// Weights of very different size: no sample has more than one effective parameter.
+TEST(SmoothingSplines, EffectiveParametersOfUnequalDeviations) {
+    Data data = Noisy(40);
+    for (std::size_t i = 0; i < data.d.size(); ++i)
+        data.d[i] = i % 5 == 0 ? 1e-15 : 1.0;
+    for (const double lambda : {1e-30, 1e-10, 1.0}) {
+        const Smoothed found = Smooth(data.x, data.y, data.d, 1, lambda);
+        EXPECT_GE(found.effective, 8.0 - 1e-9);
+        EXPECT_LE(found.effective, 40.0);
+        for (std::size_t i = 0; i < data.x.size(); i += 5)
+            EXPECT_NEAR(found.values[i], data.y[i], 1e-14);
+    }
+}
+
 TEST(SmoothingSplines, PiecesMeetSmoothlyAndInterpolateWithoutLambda) {
     const Data data = Noisy(12);
     for (const double lambda : {0.0, 0.3}) {
