@@ -41,11 +41,11 @@ QX_BEGIN_DECLS
     lowerCoefficients and upperCoefficients have a value per coefficient, lowerCurve and upperCurve
     the confidence bounds at each sample.
     Codes: ErrEmptyInput (x, y or the coefficients are empty), ErrSizeMismatch (x, y and weights
-    differ in length, or there are not two coefficients), ErrFewerThanThree (less than three
-    samples), ErrNonFiniteInput (an input is NaN or infinite, or later, a value, derivative or
+    differ in length, or the model has another number of coefficients), ErrFewerThanThree (less than
+    three samples), ErrNonFiniteInput (an input is NaN or infinite, or later, a value, derivative or
     weighted residual of the model overflows), ErrTooFewForParameters (not more weights other than 0
     than coefficients), ErrProbabilityOutOfRange (confidence), ErrSingularMatrix (J without full
-    rank: all x alike), ErrOutOfMemory (no memory, or an array cannot be resized). */
+    rank, as where all x are alike), ErrOutOfMemory (no memory, or an array cannot be resized). */
 QX_API ErrorCode ConfBndLinear_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D w,
                                     QX_IN DBL1D coefficients, double confidence,
                                     QX_OUT DBL1D lowerCoefficients, QX_OUT DBL1D upperCoefficients,
@@ -55,15 +55,8 @@ QX_API ErrorCode PredBndLinear_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D w,
                                     QX_IN DBL1D coefficients, double confidence,
                                     QX_OUT DBL1D lowerCurve, QX_OUT DBL1D upperCurve);
 
-/** Bounds of y = a exp(b x); coefficients: a, b (ExpFit80_head). lowerCoefficients and
-    upperCoefficients have a value per coefficient, lowerCurve and upperCurve the confidence bounds
-    at each sample.
-    Codes: ErrEmptyInput (x, y or the coefficients are empty), ErrSizeMismatch (x, y and weights
-    differ in length, or there are not two coefficients), ErrFewerThanThree (less than three
-    samples), ErrNonFiniteInput (an input is NaN or infinite, or later, a value, derivative or
-    weighted residual of the model overflows), ErrTooFewForParameters (not more weights other than 0
-    than coefficients), ErrProbabilityOutOfRange (confidence), ErrSingularMatrix (J without full
-    rank: a is 0, or all x alike), ErrOutOfMemory (no memory, or an array cannot be resized). */
+/** As ConfBndLinear_head, of y = a exp(b x); coefficients: a, b (ExpFit80_head). J has no full rank
+    where a is 0 either. */
 QX_API ErrorCode ConfBndExp_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D w,
                                  QX_IN DBL1D coefficients, double confidence,
                                  QX_OUT DBL1D lowerCoefficients, QX_OUT DBL1D upperCoefficients,
@@ -73,16 +66,15 @@ QX_API ErrorCode PredBndExp_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D w,
                                  QX_IN DBL1D coefficients, double confidence,
                                  QX_OUT DBL1D lowerCurve, QX_OUT DBL1D upperCurve);
 
-/** Bounds of y = a x^b, x above 0; coefficients: a, b (PowerFit_head). lowerCoefficients and
-    upperCoefficients have a value per coefficient, lowerCurve and upperCurve the confidence bounds
-    at each sample.
+/** As ConfBndLinear_head, of y = a x^b, x above 0; coefficients: a, b (PowerFit_head). J has no
+    full rank where a is 0 either.
     Codes: ErrEmptyInput (x, y or the coefficients are empty), ErrSizeMismatch (x, y and weights
     differ in length, or there are not two coefficients), ErrFewerThanThree (less than three
     samples), ErrNonFiniteInput (an input is NaN or infinite, or later, a value, derivative or
     weighted residual of the model overflows), ErrNotStrictlyPositive (an x is not above 0),
     ErrTooFewForParameters (not more weights other than 0 than coefficients),
-    ErrProbabilityOutOfRange (confidence), ErrSingularMatrix (J without full rank: a is 0, or all x
-    alike), ErrOutOfMemory (no memory, or an array cannot be resized). */
+    ErrProbabilityOutOfRange (confidence), ErrSingularMatrix (J without full rank: a is 0, or
+    all x alike), ErrOutOfMemory (no memory, or an array cannot be resized). */
 QX_API ErrorCode ConfBndPower_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D w,
                                    QX_IN DBL1D coefficients, double confidence,
                                    QX_OUT DBL1D lowerCoefficients, QX_OUT DBL1D upperCoefficients,
@@ -92,16 +84,9 @@ QX_API ErrorCode PredBndPower_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D w,
                                    QX_IN DBL1D coefficients, double confidence,
                                    QX_OUT DBL1D lowerCurve, QX_OUT DBL1D upperCurve);
 
-/** Bounds of y = a log(b x) to the given base; coefficients: a, b (LogFit_head). The base 2.71828,
-    these six digits, stands for e. lowerCoefficients and upperCoefficients have a value per
-    coefficient, lowerCurve and upperCurve the confidence bounds at each sample.
-    Codes: ErrEmptyInput (x, y or the coefficients are empty), ErrSizeMismatch (x, y and weights
-    differ in length, or there are not two coefficients), ErrFewerThanThree (less than three
-    samples), ErrNonFiniteInput (an input is NaN or infinite, or later, a value, derivative or
-    weighted residual of the model overflows), ErrNotStrictlyPositive (b x is not above 0 for all x,
-    or the base is not above 0, or is 1), ErrTooFewForParameters (not more weights other than 0 than
-    coefficients), ErrProbabilityOutOfRange (confidence), ErrSingularMatrix (J without full rank: a
-    is 0, or all x alike), ErrOutOfMemory (no memory, or an array cannot be resized). */
+/** As ConfBndPower_head, of y = a log(b x) to the given base; coefficients: a, b (LogFit_head). The
+    base 2.71828, these six digits, means e. ErrNotStrictlyPositive means here that b x is not
+    above 0 for all x, or that the base is not above 0, or is 1. */
 QX_API ErrorCode ConfBndLog_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D w,
                                  QX_IN DBL1D coefficients, double base, double confidence,
                                  QX_OUT DBL1D lowerCoefficients, QX_OUT DBL1D upperCoefficients,
@@ -111,16 +96,9 @@ QX_API ErrorCode PredBndLog_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D w,
                                  QX_IN DBL1D coefficients, double base, double confidence,
                                  QX_OUT DBL1D lowerCurve, QX_OUT DBL1D upperCurve);
 
-/** Bounds of y = a exp(-((x - c) / s)^2 / 2); coefficients: a, c, s (GaussianPeakFit_head).
-    lowerCoefficients and upperCoefficients have a value per coefficient, lowerCurve and upperCurve
-    the confidence bounds at each sample.
-    Codes: ErrEmptyInput (x, y or the coefficients are empty), ErrSizeMismatch (x, y and weights
-    differ in length, or there are not three coefficients), ErrFewerThanThree (less than three
-    samples), ErrNonFiniteInput (an input is NaN or infinite, or later, a value, derivative or
-    weighted residual of the model overflows), ErrTooFewForParameters (not more weights other than 0
-    than coefficients), ErrProbabilityOutOfRange (confidence), ErrSingularMatrix (J without full
-    rank: a or s is 0, or the samples that count lie where the curve is 0), ErrOutOfMemory (no
-    memory, or an array cannot be resized). */
+/** As ConfBndLinear_head, of y = a exp(-((x - c) / s)^2 / 2); coefficients: a, c, s
+    (GaussianPeakFit_head). J has no full rank where a or s is 0, or where the samples that
+    count lie where the curve is 0. */
 QX_API ErrorCode ConfBndGauss_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D w,
                                    QX_IN DBL1D coefficients, double confidence,
                                    QX_OUT DBL1D lowerCoefficients, QX_OUT DBL1D upperCoefficients,
@@ -130,16 +108,9 @@ QX_API ErrorCode PredBndGauss_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D w,
                                    QX_IN DBL1D coefficients, double confidence,
                                    QX_OUT DBL1D lowerCurve, QX_OUT DBL1D upperCurve);
 
-/** Bounds of the polynomial sum of coefficients[j] x^j (PolyFit_head). As in the fit, at most the
-    first 26 coefficients are parameters; others are taken as given and have no width.
-    lowerCoefficients and upperCoefficients have a value per coefficient, lowerCurve and upperCurve
-    the confidence bounds at each sample.
-    Codes: ErrEmptyInput (x, y or the coefficients are empty), ErrSizeMismatch (x, y and weights
-    differ in length), ErrFewerThanThree (less than three samples), ErrNonFiniteInput (an input is
-    NaN or infinite, or later, a value, derivative or weighted residual of the model overflows),
-    ErrTooFewForParameters (not more weights other than 0 than coefficients),
-    ErrProbabilityOutOfRange (confidence), ErrSingularMatrix (J without full rank: less different x
-    than coefficients), ErrOutOfMemory (no memory, or an array cannot be resized). */
+/** As ConfBndLinear_head, of the polynomial sum of coefficients[j] x^j, with any number of
+    coefficients (PolyFit_head). As in the fit, at most the first 26 are parameters; others are
+    taken as given and have no width. J has no full rank with less different x than parameters. */
 QX_API ErrorCode ConfBndPoly_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D w,
                                   QX_IN DBL1D coefficients, double confidence,
                                   QX_OUT DBL1D lowerCoefficients, QX_OUT DBL1D upperCoefficients,
@@ -149,10 +120,8 @@ QX_API ErrorCode PredBndPoly_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D w,
                                   QX_IN DBL1D coefficients, double confidence,
                                   QX_OUT DBL1D lowerCurve, QX_OUT DBL1D upperCurve);
 
-/** Bounds of y = H c for a matrix with one row per sample and one column per coefficient
-    (GenLSFit80_head); any number of samples above that of the columns will do. lowerCoefficients
-    and upperCoefficients have a value per coefficient, lowerCurve and upperCurve the confidence
-    bounds at each sample.
+/** As ConfBndLinear_head, of y = H c for a matrix with one row per sample and one column per
+    coefficient (GenLSFit80_head); any number of samples above that of the columns will do.
     Codes: ErrEmptyInput (H, y or the coefficients are empty), ErrSizeMismatch (H, y and weights
     differ in length, or the columns and the coefficients in number), ErrNonFiniteInput (an input is
     NaN or infinite, or later, a value, derivative or weighted residual of the model overflows),

@@ -68,9 +68,7 @@ struct Samples {
             const bool isThere = lane < left;
             xs[lane] = s.x[isThere ? i + lane : s.count - 1];
             ys[lane] = isThere ? s.y[i + lane] : 0.0;
-            weight[lane] = !isThere           ? 0.0
-                           : s.w == nullptr   ? 1.0
-                                              : __builtin_fabs(s.w[i + lane]);
+            weight[lane] = !isThere ? 0.0 : s.w == nullptr ? 1.0 : __builtin_fabs(s.w[i + lane]);
         }
         x = Four::load(xs);
         y = Four::load(ys);
@@ -132,9 +130,9 @@ void WriteRows(const SpanSamples &samples, const DBL *knots, double scale, DBL *
     }
 }
 
-// H = I - tau u u' with u = (1, v / (alpha - beta)) maps (alpha, v) to (beta, 0), where alpha is the
-// diagonal element r[0] and v the column; Rest columns follow, the target last. The sign of beta is
-// the one with which nothing cancels.
+// H = I - tau u u' with u = (1, v / (alpha - beta)) maps (alpha, v) to (beta, 0), where alpha is
+// the diagonal element r[0] and v the column; Rest columns follow, the target last. The sign of
+// beta is the one with which nothing cancels.
 template <int Rest>
 void Reflect(DBL *v, int32_t rows, DBL *r, int32_t target) {
     Four squares(0.0), products[Rest];
@@ -214,18 +212,18 @@ void Evaluate(const SpanSamples &samples, const DBL *knots, const DBL *coefficie
 
 void ReduceSpan(const SpanSamples *samples, const DBL *knots, int32_t degree, double scale,
                 DBL *triangle, DBL *work) {
-    constexpr decltype(&Reduce<1>) reduce[] = {Reduce<1>, Reduce<2>, Reduce<3>, Reduce<4>,
-                                               Reduce<5>, Reduce<6>, Reduce<7>, Reduce<8>,
-                                               Reduce<kHighestSplineDegree>};
+    constexpr decltype(&Reduce<1>) reduce[] = {Reduce<1>, Reduce<2>, Reduce<3>,
+                                               Reduce<4>, Reduce<5>, Reduce<6>,
+                                               Reduce<7>, Reduce<8>, Reduce<kHighestSplineDegree>};
     reduce[degree - 1](*samples, knots, scale, triangle, work);
 }
 
 void EvaluateSpan(const SpanSamples *samples, const DBL *knots, int32_t degree,
                   const DBL *coefficients, DBL *values, DBL *squares) {
-    constexpr decltype(&Evaluate<1>) evaluate[] = {Evaluate<1>, Evaluate<2>, Evaluate<3>,
-                                                   Evaluate<4>, Evaluate<5>, Evaluate<6>,
-                                                   Evaluate<7>, Evaluate<8>,
-                                                   Evaluate<kHighestSplineDegree>};
+    constexpr decltype(&Evaluate<1>) evaluate[] = {
+        Evaluate<1>, Evaluate<2>, Evaluate<3>,
+        Evaluate<4>, Evaluate<5>, Evaluate<6>,
+        Evaluate<7>, Evaluate<8>, Evaluate<kHighestSplineDegree>};
     evaluate[degree - 1](*samples, knots, coefficients, values, squares);
 }
 

@@ -10,7 +10,8 @@ namespace qx {
 // What the pass forwards leaves of the interval from sample i to i + 1 for that backwards: with the
 // value g and the slope s at i + 1,
 //     u1 = t1 - a1 g - a2 s + noise of variance v1,   s of sample i: s - u1,
-//     u2 = t2 - q u1 - b1 g - b2 s + noise of v2,     g of sample i: g - h s + h/2 u1 + h/sqrt(12) u2.
+//     u2 = t2 - q u1 - b1 g - b2 s + noise of v2,     g of sample i: g - h s + h/2 u1 + h/sqrt(12)
+//     u2.
 // The mean of s'' is u1 / h, and half of its growth is sqrt(3) u2 / h.
 struct SmoothingSpline::Step {
     DBL t1, a1, a2, v1;
@@ -44,8 +45,8 @@ struct Turn {
     }
 };
 
-// Where the growing f, above 0 at high and not at low, has its zero: the last x found, to 1e-13 of x
-// or of 1, with f not above 0 (T. R. Chandrupatla, A new hybrid quadratic/bisection algorithm for
+// Where the growing f, above 0 at high and not at low, has its zero: the last x found, to 1e-13 of
+// x or of 1, with f not above 0 (T. R. Chandrupatla, A new hybrid quadratic/bisection algorithm for
 // finding the zero of a nonlinear function without using derivatives, 1997).
 template <class Function>
 double LastNotAbove(const Function &f, double low, double atLow, double high, double atHigh) {
@@ -188,8 +189,8 @@ SmoothingSpline::Quality SmoothingSpline::backwards(const Triangle &last, DBL *v
     for (int32_t i = n_ - 1;; --i) {
         const double weight = 1.0 / deviation(i), u = weight * (rest_[i] - g);
         quality.squares += u * u;
-        // The variance is at most that of the sample alone; rounding lifts it where weights or steps
-        // differ by more than the digits.
+        // The variance is at most that of the sample alone; rounding lifts it where weights or
+        // steps differ by more than the digits.
         quality.effective += std::min(1.0, weight * weight * vgg);
         values[i] = g;
         if (i == 0)

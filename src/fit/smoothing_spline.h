@@ -37,7 +37,9 @@ private:
 
     double spacing(int32_t i) const { return (x_[i + 1] - x_[i]) / unitOfX_; }
     double deviation(int32_t i) const { return d_ == nullptr ? 1.0 : d_[i] / unitOfD_; }
-    double onLine(int32_t i) const { return meanY_ + slope_ * ((x_[i] - x_[0]) / unitOfX_ - meanX_); }
+    double onLine(int32_t i) const {
+        return meanY_ + slope_ * ((x_[i] - x_[0]) / unitOfX_ - meanX_);
+    }
     void takeOffLine();
     Triangle forwards(double lambda);
     Quality backwards(const Triangle &last, DBL *values, DBL *second) const;

@@ -239,18 +239,39 @@ Outcome MatrixBounds(In<DBL2D> h, const Samples &samples, double confidence, con
                   samples.coefficients, confidence, out);
 }
 
-// The frames.
+// What the frames of confidence and prediction are made of: the type of x and the bounds.
+template <class Model>
+struct OfCurve {
+    typedef In<DBL1D> X;
+    template <class Outputs>
+    static Outcome bounds(X x, const Samples &samples, double confidence, const Outputs &out) {
+        return CurveBounds(Model(), x, samples, confidence, out);
+    }
+};
+struct OfPolynomial {
+    typedef In<DBL1D> X;
+    template <class Outputs>
+    static Outcome bounds(X x, const Samples &samples, double confidence, const Outputs &out) {
+        return PolynomialBounds(x, samples, confidence, out);
+    }
+};
+struct OfMatrix {
+    typedef In<DBL2D> X;
+    template <class Outputs>
+    static Outcome bounds(X h, const Samples &samples, double confidence, const Outputs &out) {
+        return MatrixBounds(h, samples, confidence, out);
+    }
+};
 
-template <class Model>
-Outcome ConfOfCurve(In<DBL1D> x, In<DBL1D> y, In<DBL1D> w, In<DBL1D> c, double confidence,
-                    Out<DBL1D> lowerC, Out<DBL1D> upperC, Out<DBL1D> lower, Out<DBL1D> upper) {
-    return CurveBounds(Model(), x, {y, w, c}, confidence,
-                       ConfidenceOutputs{lowerC, upperC, lower, upper});
+template <class Of>
+Outcome Conf(typename Of::X x, In<DBL1D> y, In<DBL1D> w, In<DBL1D> c, double confidence,
+             Out<DBL1D> lowerC, Out<DBL1D> upperC, Out<DBL1D> lower, Out<DBL1D> upper) {
+    return Of::bounds(x, {y, w, c}, confidence, ConfidenceOutputs{lowerC, upperC, lower, upper});
 }
-template <class Model>
-Outcome PredOfCurve(In<DBL1D> x, In<DBL1D> y, In<DBL1D> w, In<DBL1D> c, double confidence,
-                    Out<DBL1D> lower, Out<DBL1D> upper) {
-    return CurveBounds(Model(), x, {y, w, c}, confidence, PredictionOutputs{lower, upper});
+template <class Of>
+Outcome Pred(typename Of::X x, In<DBL1D> y, In<DBL1D> w, In<DBL1D> c, double confidence,
+             Out<DBL1D> lower, Out<DBL1D> upper) {
+    return Of::bounds(x, {y, w, c}, confidence, PredictionOutputs{lower, upper});
 }
 
 // A base of NaN is out of range, an infinite one is not finite.
@@ -274,24 +295,6 @@ Outcome PredOfLog(In<DBL1D> x, In<DBL1D> y, In<DBL1D> w, In<DBL1D> c, double bas
     return LogarithmBounds(x, {y, w, c}, base, confidence, PredictionOutputs{lower, upper});
 }
 
-Outcome ConfOfPolynomial(In<DBL1D> x, In<DBL1D> y, In<DBL1D> w, In<DBL1D> c, double confidence,
-                         Out<DBL1D> lowerC, Out<DBL1D> upperC, Out<DBL1D> lower, Out<DBL1D> upper) {
-    return PolynomialBounds(x, {y, w, c}, confidence,
-                            ConfidenceOutputs{lowerC, upperC, lower, upper});
-}
-Outcome PredOfPolynomial(In<DBL1D> x, In<DBL1D> y, In<DBL1D> w, In<DBL1D> c, double confidence,
-                         Out<DBL1D> lower, Out<DBL1D> upper) {
-    return PolynomialBounds(x, {y, w, c}, confidence, PredictionOutputs{lower, upper});
-}
-Outcome ConfOfMatrix(In<DBL2D> h, In<DBL1D> y, In<DBL1D> w, In<DBL1D> c, double confidence,
-                     Out<DBL1D> lowerC, Out<DBL1D> upperC, Out<DBL1D> lower, Out<DBL1D> upper) {
-    return MatrixBounds(h, {y, w, c}, confidence, ConfidenceOutputs{lowerC, upperC, lower, upper});
-}
-Outcome PredOfMatrix(In<DBL2D> h, In<DBL1D> y, In<DBL1D> w, In<DBL1D> c, double confidence,
-                     Out<DBL1D> lower, Out<DBL1D> upper) {
-    return MatrixBounds(h, {y, w, c}, confidence, PredictionOutputs{lower, upper});
-}
-
 } // namespace
 } // namespace qx
 
@@ -300,36 +303,36 @@ using qx::Returned;
 ErrorCode ConfBndLinear_head(DBL1D x, DBL1D y, DBL1D w, DBL1D coefficients, double confidence,
                              DBL1D lowerCoefficients, DBL1D upperCoefficients, DBL1D lowerCurve,
                              DBL1D upperCurve) {
-    return Returned(qx::ConfOfCurve<qx::Line>, x, y, w, coefficients, confidence, lowerCoefficients,
-                    upperCoefficients, lowerCurve, upperCurve);
+    return Returned(qx::Conf<qx::OfCurve<qx::Line>>, x, y, w, coefficients, confidence,
+                    lowerCoefficients, upperCoefficients, lowerCurve, upperCurve);
 }
 ErrorCode PredBndLinear_head(DBL1D x, DBL1D y, DBL1D w, DBL1D coefficients, double confidence,
                              DBL1D lowerCurve, DBL1D upperCurve) {
-    return Returned(qx::PredOfCurve<qx::Line>, x, y, w, coefficients, confidence, lowerCurve,
+    return Returned(qx::Pred<qx::OfCurve<qx::Line>>, x, y, w, coefficients, confidence, lowerCurve,
                     upperCurve);
 }
 
 ErrorCode ConfBndExp_head(DBL1D x, DBL1D y, DBL1D w, DBL1D coefficients, double confidence,
                           DBL1D lowerCoefficients, DBL1D upperCoefficients, DBL1D lowerCurve,
                           DBL1D upperCurve) {
-    return Returned(qx::ConfOfCurve<qx::Exponential>, x, y, w, coefficients, confidence,
+    return Returned(qx::Conf<qx::OfCurve<qx::Exponential>>, x, y, w, coefficients, confidence,
                     lowerCoefficients, upperCoefficients, lowerCurve, upperCurve);
 }
 ErrorCode PredBndExp_head(DBL1D x, DBL1D y, DBL1D w, DBL1D coefficients, double confidence,
                           DBL1D lowerCurve, DBL1D upperCurve) {
-    return Returned(qx::PredOfCurve<qx::Exponential>, x, y, w, coefficients, confidence, lowerCurve,
-                    upperCurve);
+    return Returned(qx::Pred<qx::OfCurve<qx::Exponential>>, x, y, w, coefficients, confidence,
+                    lowerCurve, upperCurve);
 }
 
 ErrorCode ConfBndPower_head(DBL1D x, DBL1D y, DBL1D w, DBL1D coefficients, double confidence,
                             DBL1D lowerCoefficients, DBL1D upperCoefficients, DBL1D lowerCurve,
                             DBL1D upperCurve) {
-    return Returned(qx::ConfOfCurve<qx::Power>, x, y, w, coefficients, confidence,
+    return Returned(qx::Conf<qx::OfCurve<qx::Power>>, x, y, w, coefficients, confidence,
                     lowerCoefficients, upperCoefficients, lowerCurve, upperCurve);
 }
 ErrorCode PredBndPower_head(DBL1D x, DBL1D y, DBL1D w, DBL1D coefficients, double confidence,
                             DBL1D lowerCurve, DBL1D upperCurve) {
-    return Returned(qx::PredOfCurve<qx::Power>, x, y, w, coefficients, confidence, lowerCurve,
+    return Returned(qx::Pred<qx::OfCurve<qx::Power>>, x, y, w, coefficients, confidence, lowerCurve,
                     upperCurve);
 }
 
@@ -347,34 +350,35 @@ ErrorCode PredBndLog_head(DBL1D x, DBL1D y, DBL1D w, DBL1D coefficients, double 
 ErrorCode ConfBndGauss_head(DBL1D x, DBL1D y, DBL1D w, DBL1D coefficients, double confidence,
                             DBL1D lowerCoefficients, DBL1D upperCoefficients, DBL1D lowerCurve,
                             DBL1D upperCurve) {
-    return Returned(qx::ConfOfCurve<qx::Gaussian>, x, y, w, coefficients, confidence,
+    return Returned(qx::Conf<qx::OfCurve<qx::Gaussian>>, x, y, w, coefficients, confidence,
                     lowerCoefficients, upperCoefficients, lowerCurve, upperCurve);
 }
 ErrorCode PredBndGauss_head(DBL1D x, DBL1D y, DBL1D w, DBL1D coefficients, double confidence,
                             DBL1D lowerCurve, DBL1D upperCurve) {
-    return Returned(qx::PredOfCurve<qx::Gaussian>, x, y, w, coefficients, confidence, lowerCurve,
-                    upperCurve);
+    return Returned(qx::Pred<qx::OfCurve<qx::Gaussian>>, x, y, w, coefficients, confidence,
+                    lowerCurve, upperCurve);
 }
 
 ErrorCode ConfBndPoly_head(DBL1D x, DBL1D y, DBL1D w, DBL1D coefficients, double confidence,
                            DBL1D lowerCoefficients, DBL1D upperCoefficients, DBL1D lowerCurve,
                            DBL1D upperCurve) {
-    return Returned(qx::ConfOfPolynomial, x, y, w, coefficients, confidence, lowerCoefficients,
-                    upperCoefficients, lowerCurve, upperCurve);
+    return Returned(qx::Conf<qx::OfPolynomial>, x, y, w, coefficients, confidence,
+                    lowerCoefficients, upperCoefficients, lowerCurve, upperCurve);
 }
 ErrorCode PredBndPoly_head(DBL1D x, DBL1D y, DBL1D w, DBL1D coefficients, double confidence,
                            DBL1D lowerCurve, DBL1D upperCurve) {
-    return Returned(qx::PredOfPolynomial, x, y, w, coefficients, confidence, lowerCurve,
+    return Returned(qx::Pred<qx::OfPolynomial>, x, y, w, coefficients, confidence, lowerCurve,
                     upperCurve);
 }
 
 ErrorCode ConfBndGenLS_head(DBL2D H, DBL1D y, DBL1D w, DBL1D coefficients, double confidence,
                             DBL1D lowerCoefficients, DBL1D upperCoefficients, DBL1D lowerCurve,
                             DBL1D upperCurve) {
-    return Returned(qx::ConfOfMatrix, H, y, w, coefficients, confidence, lowerCoefficients,
+    return Returned(qx::Conf<qx::OfMatrix>, H, y, w, coefficients, confidence, lowerCoefficients,
                     upperCoefficients, lowerCurve, upperCurve);
 }
 ErrorCode PredBndGenLS_head(DBL2D H, DBL1D y, DBL1D w, DBL1D coefficients, double confidence,
                             DBL1D lowerCurve, DBL1D upperCurve) {
-    return Returned(qx::PredOfMatrix, H, y, w, coefficients, confidence, lowerCurve, upperCurve);
+    return Returned(qx::Pred<qx::OfMatrix>, H, y, w, coefficients, confidence, lowerCurve,
+                    upperCurve);
 }

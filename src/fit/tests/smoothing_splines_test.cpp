@@ -173,8 +173,7 @@ TEST(SmoothingSplines, CrowdedSamplesCountAsOne) {
         EXPECT_NEAR(three.effective, one.effective, 1e-8) << lambda;
         for (std::size_t i = 0; i < merged.x.size(); ++i) {
             ASSERT_NEAR(three.values[3 * i + 1], one.values[i], 1e-8) << lambda;
-            ASSERT_NEAR(three.second[3 * i + 1], one.second[i], 1e-9 / lambda + 1e-10)
-                << lambda;
+            ASSERT_NEAR(three.second[3 * i + 1], one.second[i], 1e-9 / lambda + 1e-10) << lambda;
         }
     }
 }
