@@ -30,8 +30,8 @@ QX_BEGIN_DECLS
     Codes: ErrEmptyInput (x or y is empty), ErrSizeMismatch (x, y and deviations differ in
     length), ErrInvalidSelector (method), ErrNonFiniteInput (an array or parameter),
     ErrNotStrictlyPositive (a deviation), ErrNegativeSetting (parameter of methods 1 and 2 below
-    0 or NaN), ErrAbscissaeOrder (x does not ascend), ErrOutOfMemory (no memory, or an array
-    cannot be resized). */
+    0 or NaN), ErrAbscissaeOrder (x does not ascend), ErrOutOfMemory (no memory, more than 29
+    million samples, or an array cannot be resized). */
 QX_API ErrorCode CubicSplineFit_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D deviations,
                                      int32_t method, double parameter, QX_OUT DBL1D values,
                                      QX_OUT DBL2D coefficients, QX_OUT DBL1D secondDerivatives,

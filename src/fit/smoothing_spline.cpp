@@ -245,14 +245,14 @@ void SmoothingSpline::interpolate(DBL *second) {
         second[i] -= above[i] * second[i + 1];
 }
 
-// The lowest score between low and high, to 1e-5 beside `middle`, whose score is below both ends':
-// parabolas, and the golden section where these do not converge (R. P. Brent, Algorithms for
+// Moves *at, whose score is `least`, to the lowest score between low and high, to 1e-5, and returns
+// that: parabolas, and the golden section where these do not converge (R. P. Brent, Algorithms for
 // Minimization Without Derivatives, 1973).
-double SmoothingSpline::leastScore(double low, double middle, double high, DBL *values, DBL *second,
-                                   double *at) {
+double SmoothingSpline::leastScore(double low, double high, DBL *values, DBL *second, double *at,
+                                   double least) {
     constexpr double golden = 0x1.8722191a02d61p-2, tolerance = 2.5e-6;
-    double best = middle, next = middle, old = middle; // the lowest three scores so far
-    double atBest = score(best, values, second), atNext = atBest, atOld = atBest;
+    double best = *at, next = best, old = best; // the lowest three scores so far
+    double atBest = least, atNext = least, atOld = least;
     double step = 0.0, stepBefore = 0.0;
     while (std::fabs(best - 0.5 * (low + high)) + 0.5 * (high - low) > 2.0 * tolerance) {
         const double centre = 0.5 * (low + high);
@@ -304,7 +304,7 @@ double SmoothingSpline::crossValidated(DBL *values, DBL *second) {
             at = i * decade;
         }
     }
-    least = leastScore(at - decade, at, at + decade, values, second, &at);
+    least = leastScore(at - decade, at + decade, values, second, &at, least);
     constexpr double clearly = 1.0 - 1e-7; // below the rounding errors of the scores
     const double freedom = n_ - 2.0;
     return least < clearly * (lineSquares_ / (freedom * freedom)) ? std::exp(at) : kInfinity;

@@ -47,7 +47,7 @@ private:
     double score(double logLambda, DBL *values, DBL *second);
     void interpolate(DBL *second);
     double crossValidated(DBL *values, DBL *second);
-    double leastScore(double low, double middle, double high, DBL *values, DBL *second, double *at);
+    double leastScore(double low, double high, DBL *values, DBL *second, double *at, double least);
     double within(double squares, DBL *values, DBL *second);
 
     const DBL *x_ = nullptr, *y_ = nullptr, *d_ = nullptr;
