@@ -116,16 +116,18 @@ ErrorCode FitBSpline(const DBL *x, const DBL *y, const DBL *w, int32_t n, int32_
     if (!(x[0] < x[n - 1]))
         return ErrPolynomialOrderTooHigh;
     const int32_t stride = degree + 2;
-    Scratch<ElementType::DBL> memory; // the triangle, and a block of rows by columns
-    if (const ErrorCode failed = memory.allocate((int64_t{count} + kSplineRows) * stride))
+    DBL *elements, *rows;
+    ScratchParts memory;
+    if (const ErrorCode failed = memory.take(Sized(elements, int64_t{count} * stride),
+                                             Sized(rows, kSplineRows * stride)))
         return failed;
-    const BandedTriangle triangle(memory.data(), count, degree + 1);
+    const BandedTriangle triangle(elements, count, degree + 1);
     const SpanSamples all = {x, y, w, n};
     const double scale = ScaleOfWeights(w, n);
     SpanSamples run;
     for (Spans spans(all, knots, degree, count); spans.next(&run);)
         ReduceSpan(&run, knots + spans.span(), degree, scale, triangle.row(spans.span() - degree),
-                   triangle.row(count));
+                   rows);
     if (!triangle.hasFullRank())
         return ErrPolynomialOrderTooHigh;
     triangle.solve(coefficients);

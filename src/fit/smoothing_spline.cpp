@@ -86,10 +86,7 @@ ErrorCode SmoothingSpline::make(const DBL *x, const DBL *y, const DBL *d, int32_
     n_ = n;
     unitOfX_ = (x[n - 1] - x[0]) / (n - 1);
     unitOfD_ = d == nullptr ? 1.0 : *std::max_element(d, d + n);
-    constexpr int64_t elements = sizeof(Step) / sizeof(DBL);
-    if (const ErrorCode failed = rest_.allocate(n))
-        return failed;
-    if (const ErrorCode failed = steps_.allocate(elements * (n - 1)))
+    if (const ErrorCode failed = memory_.take(Sized(rest_, n), Sized(steps_, int64_t{n} - 1)))
         return failed;
     takeOffLine();
     return 0;
@@ -122,7 +119,6 @@ void SmoothingSpline::takeOffLine() {
 // The rows are sample i: (1 / d) g = y / d, and step i: u sqrt(lambda) = 0, where the state i is
 // written by u and the state i + 1. Returns the triangle of the last sample.
 SmoothingSpline::Triangle SmoothingSpline::forwards(double lambda) {
-    auto *const steps = reinterpret_cast<Step *>(steps_.data());
     const double rootOfLambda = std::sqrt(lambda);
     Triangle r = {1.0 / deviation(0), 0.0, 0.0, rest_[0] / deviation(0), 0.0};
     for (int32_t i = 0; i < n_ - 1; ++i) {
@@ -136,7 +132,7 @@ SmoothingSpline::Triangle SmoothingSpline::forwards(double lambda) {
         double length = 1.0;
         const Turn second(&length, e2);
         const double share = second.s / length;
-        Step &step = steps[i];
+        Step &step = steps_[i];
         step.t2 = gamma * share * r.z1;
         step.q = share * e1;
         step.b1 = gamma * share * r.r11;
@@ -179,7 +175,6 @@ SmoothingSpline::Triangle SmoothingSpline::forwards(double lambda) {
 // second: in units of the mean spacing, 0 at both ends.
 SmoothingSpline::Quality SmoothingSpline::backwards(const Triangle &last, DBL *values,
                                                     DBL *second) const {
-    const auto *const steps = reinterpret_cast<const Step *>(steps_.data());
     double s = last.z2 / last.r22, g = (last.z1 - last.r12 * s) / last.r11;
     // The variances of g and s and their covariance.
     double vss = 1.0 / (last.r22 * last.r22);
@@ -195,7 +190,7 @@ SmoothingSpline::Quality SmoothingSpline::backwards(const Triangle &last, DBL *v
         values[i] = g;
         if (i == 0)
             break;
-        const Step &step = steps[i - 1];
+        const Step &step = steps_[i - 1];
         const double h = spacing(i - 1), k = h / rootOf12, m = 0.5 * h - k * step.q;
         const double u1 = step.t1 - step.a1 * g - step.a2 * s;
         const double u2 = step.t2 - step.q * u1 - step.b1 * g - step.b2 * s;
@@ -229,7 +224,7 @@ double SmoothingSpline::score(double logLambda, DBL *values, DBL *second) {
 
 // The spline through the samples: R s'' = Q' y, tridiagonal, by elimination.
 void SmoothingSpline::interpolate(DBL *second) {
-    DBL *const above = rest_.data();
+    DBL *const above = rest_;
     double before = 0.0, slope = (y_[1] - y_[0]) / spacing(0);
     above[0] = second[0] = 0.0;
     for (int32_t i = 1; i < n_ - 1; ++i) {

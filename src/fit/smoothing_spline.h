@@ -54,8 +54,9 @@ private:
     int32_t n_ = 0;
     double unitOfX_ = 1.0, unitOfD_ = 1.0;
     double meanX_ = 0.0, meanY_ = 0.0, slope_ = 0.0, lineSquares_ = 0.0;
-    Scratch<ElementType::DBL> rest_;  // y less the line
-    Scratch<ElementType::DBL> steps_; // n - 1 of Step
+    DBL *rest_ = nullptr; // y less the line
+    Step *steps_ = nullptr;
+    ScratchParts memory_;
 };
 
 } // namespace qx

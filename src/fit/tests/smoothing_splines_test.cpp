@@ -342,6 +342,18 @@ TEST(SmoothingSplines, ResidualsAreOrthogonalForAnyKnots) {
         }
 }
 
+TEST(SmoothingSplines, LeastSquaresWithWeightsAtTheEdgesOfTheRange) {
+    const Data data = Noisy(80);
+    Samples small, large;
+    for (const double w : data.d) {
+        small.push_back(std::ldexp(w, -1000));
+        large.push_back(std::ldexp(w, 1000));
+    }
+    const Fitted found = FitB(data.x, data.y, data.d, 3, 6);
+    EXPECT_EQ(FitB(data.x, data.y, small, 3, 6).c, found.c);
+    EXPECT_EQ(FitB(data.x, data.y, large, 3, 6).c, found.c);
+}
+
 // Quantiles among equal x are that x to the bit.
 TEST(SmoothingSplines, KnotsAmongEqualSamples) {
     Samples x(300), y(300);
