@@ -9,18 +9,29 @@ namespace qx {
 
 // What the pass forwards leaves of the interval from sample i to i + 1 for that backwards: with the
 // value g and the slope s at i + 1,
-//     u1 = t1 - a1 g - a2 s + noise of variance v1,   s of sample i: s - u1,
-//     u2 = t2 - q u1 - b1 g - b2 s + noise of v2,     g of sample i: g - h s + h/2 u1 + h/sqrt(12)
-//     u2.
+//     u1 = t1 - a1 g - a2 s + noise of variance v1,
+//     u2 = t2 - q u1 - b1 g - b2 s + noise of variance v2,
+// and the value at i is g - h s + h/2 u1 + h/sqrt(12) u2, the slope there s - u1.
 // The mean of s'' is u1 / h, and half of its growth is sqrt(3) u2 / h.
 struct SmoothingSpline::Step {
     DBL t1, a1, a2, v1;
     DBL t2, q, b1, b2, v2;
 };
 
-// (r11 r12; 0 r22) (g, s) = (z1, z2).
+// (r11 r12; r21 r22) (g, s) = (z1, z2), r21 other than 0 only from a step to its sample.
 struct SmoothingSpline::Triangle {
-    double r11, r12, r22, z1, z2;
+    double r11, r12, r21, r22, z1, z2;
+
+    void takeStep(double h, double gamma, Step *step);
+    void takeSample(double weight, double y);
+};
+
+// The variances of g and s and their covariance.
+struct SmoothingSpline::Covariance {
+    double gg, gs, ss;
+
+    explicit Covariance(const Triangle &r);
+    void stepBack(double h, const Step &step);
 };
 
 namespace {
@@ -116,95 +127,109 @@ void SmoothingSpline::takeOffLine() {
     }
 }
 
-// The rows are sample i: (1 / d) g = y / d, and step i: u sqrt(lambda) = 0, where the state i is
-// written by u and the state i + 1. Returns the triangle of the last sample.
+// A row for each u, u / gamma = 0, joins the triangle, whose state is written by the u and the next
+// state: rows (u1, u2 | g, s | z) of (e1, e2 | r11, r12 | z1) and (e3, 0 | 0, r22 | z2). Columns of
+// u are in units of gamma.
+void SmoothingSpline::Triangle::takeStep(double h, double gamma, Step *step) {
+    double e1 = gamma * (0.5 * h * r11 - r12), e3 = -gamma * r22;
+    const double e2 = gamma * (h / rootOf12) * r11;
+    r12 -= h * r11;
+
+    double length = 1.0;
+    const Turn second(&length, e2);
+    const double share = second.s / length;
+    step->t2 = gamma * share * z1;
+    step->q = share * e1;
+    step->b1 = gamma * share * r11;
+    step->b2 = gamma * share * r12;
+    step->v2 = (gamma / length) * (gamma / length);
+    for (double *const element : {&e1, &r11, &r12, &z1})
+        *element *= second.c;
+
+    double a1 = 0.0, a2 = 0.0, t1 = 0.0;
+    length = 1.0;
+    const Turn first(&length, e1);
+    first.apply(&a1, &r11);
+    first.apply(&a2, &r12);
+    first.apply(&t1, &z1);
+    const Turn third(&length, e3);
+    third.apply(&a1, &r21);
+    third.apply(&a2, &r22);
+    third.apply(&t1, &z2);
+    const double scale = gamma / length;
+    step->t1 = scale * t1;
+    step->a1 = scale * a1;
+    step->a2 = scale * a2;
+    step->v1 = scale * scale;
+}
+
+// The row weight g = weight y joins, and the triangle is one again.
+void SmoothingSpline::Triangle::takeSample(double weight, double y) {
+    double fill = 0.0, rest = weight * y;
+    const Turn sample(&r11, weight);
+    sample.apply(&r12, &fill);
+    sample.apply(&z1, &rest);
+    const Turn below(&r11, r21);
+    below.apply(&r12, &r22);
+    below.apply(&z1, &z2);
+    const Turn corner(&r22, fill);
+    corner.apply(&z2, &rest);
+    r21 = 0.0;
+}
+
+// The triangle of the last sample.
 SmoothingSpline::Triangle SmoothingSpline::forwards(double lambda) {
     const double rootOfLambda = std::sqrt(lambda);
-    Triangle r = {1.0 / deviation(0), 0.0, 0.0, rest_[0] / deviation(0), 0.0};
+    Triangle triangle = {1.0 / deviation(0), 0.0, 0.0, 0.0, rest_[0] / deviation(0), 0.0};
     for (int32_t i = 0; i < n_ - 1; ++i) {
-        const double h = spacing(i), gamma = std::sqrt(h) / rootOfLambda;
-        // Rows (u1, u2 | g, s | z): the triangle's become (e1, e2 | r11, r12 | z1) and (e3, 0 | 0,
-        // r22 | z2); the columns of u in units of gamma.
-        double e1 = gamma * (0.5 * h * r.r11 - r.r12), e3 = -gamma * r.r22;
-        const double e2 = gamma * (h / rootOf12) * r.r11;
-        r.r12 -= h * r.r11;
-
-        double length = 1.0;
-        const Turn second(&length, e2);
-        const double share = second.s / length;
-        Step &step = steps_[i];
-        step.t2 = gamma * share * r.z1;
-        step.q = share * e1;
-        step.b1 = gamma * share * r.r11;
-        step.b2 = gamma * share * r.r12;
-        step.v2 = (gamma / length) * (gamma / length);
-        for (double *const element : {&e1, &r.r11, &r.r12, &r.z1})
-            *element *= second.c;
-
-        double r21 = 0.0, a1 = 0.0, a2 = 0.0, t1 = 0.0;
-        length = 1.0;
-        const Turn first(&length, e1);
-        first.apply(&a1, &r.r11);
-        first.apply(&a2, &r.r12);
-        first.apply(&t1, &r.z1);
-        const Turn third(&length, e3);
-        third.apply(&a1, &r21);
-        third.apply(&a2, &r.r22);
-        third.apply(&t1, &r.z2);
-        const double scale = gamma / length;
-        step.t1 = scale * t1;
-        step.a1 = scale * a1;
-        step.a2 = scale * a2;
-        step.v1 = scale * scale;
-
-        // Sample i + 1, and the triangle again.
-        const double weight = 1.0 / deviation(i + 1);
-        double fill = 0.0, z3 = weight * rest_[i + 1];
-        const Turn sample(&r.r11, weight);
-        sample.apply(&r.r12, &fill);
-        sample.apply(&r.z1, &z3);
-        const Turn below(&r.r11, r21);
-        below.apply(&r.r12, &r.r22);
-        below.apply(&r.z1, &r.z2);
-        const Turn corner(&r.r22, fill);
-        corner.apply(&r.z2, &z3);
+        const double h = spacing(i);
+        triangle.takeStep(h, std::sqrt(h) / rootOfLambda, &steps_[i]);
+        triangle.takeSample(1.0 / deviation(i + 1), rest_[i + 1]);
     }
-    return r;
+    return triangle;
+}
+
+SmoothingSpline::Covariance::Covariance(const Triangle &r) {
+    ss = 1.0 / (r.r22 * r.r22);
+    gs = -r.r12 / r.r11 * ss;
+    gg = 1.0 / (r.r11 * r.r11) - r.r12 / r.r11 * gs;
+}
+
+// The state before is F (g, s) and noise, by the formulas of Step.
+void SmoothingSpline::Covariance::stepBack(double h, const Step &step) {
+    const double k = h / rootOf12, m = 0.5 * h - k * step.q;
+    const double f11 = 1.0 - k * step.b1 - m * step.a1, f12 = -(h + k * step.b2 + m * step.a2);
+    const double f21 = step.a1, f22 = 1.0 + step.a2;
+    const double g0 = f11 * gg + f12 * gs, g1 = f11 * gs + f12 * ss;
+    const double s0 = f21 * gg + f22 * gs, s1 = f21 * gs + f22 * ss;
+    gg = (f11 * g0 + f12 * g1) + (m * m * step.v1 + k * k * step.v2);
+    gs = (f11 * s0 + f12 * s1) - m * step.v1;
+    ss = (f21 * s0 + f22 * s1) + step.v1;
 }
 
 // second: in units of the mean spacing, 0 at both ends.
 SmoothingSpline::Quality SmoothingSpline::backwards(const Triangle &last, DBL *values,
                                                     DBL *second) const {
     double s = last.z2 / last.r22, g = (last.z1 - last.r12 * s) / last.r11;
-    // The variances of g and s and their covariance.
-    double vss = 1.0 / (last.r22 * last.r22);
-    double vgs = -last.r12 / last.r11 * vss;
-    double vgg = 1.0 / (last.r11 * last.r11) - last.r12 / last.r11 * vgs;
+    Covariance variance(last);
     Quality quality = {0.0, 0.0};
     for (int32_t i = n_ - 1;; --i) {
         const double weight = 1.0 / deviation(i), u = weight * (rest_[i] - g);
         quality.squares += u * u;
         // The variance is at most that of the sample alone; rounding lifts it where weights or
         // steps differ by more than the digits.
-        quality.effective += std::min(1.0, weight * weight * vgg);
+        quality.effective += std::min(1.0, weight * weight * variance.gg);
         values[i] = g;
         if (i == 0)
             break;
         const Step &step = steps_[i - 1];
-        const double h = spacing(i - 1), k = h / rootOf12, m = 0.5 * h - k * step.q;
+        const double h = spacing(i - 1);
         const double u1 = step.t1 - step.a1 * g - step.a2 * s;
         const double u2 = step.t2 - step.q * u1 - step.b1 * g - step.b2 * s;
         second[i - 1] = (u1 - rootOf3 * u2) / h;
-        g = g - h * s + (0.5 * h * u1 + k * u2);
+        g = g - h * s + (0.5 * h * u1 + h / rootOf12 * u2);
         s = s - u1;
-
-        const double gg = 1.0 - k * step.b1 - m * step.a1, gs = -(h + k * step.b2 + m * step.a2);
-        const double sg = step.a1, ss = 1.0 + step.a2;
-        const double g0 = gg * vgg + gs * vgs, g1 = gg * vgs + gs * vss;
-        const double s0 = sg * vgg + ss * vgs, s1 = sg * vgs + ss * vss;
-        vgg = (gg * g0 + gs * g1) + (m * m * step.v1 + k * k * step.v2);
-        vgs = (gg * s0 + gs * s1) - m * step.v1;
-        vss = (sg * s0 + ss * s1) + step.v1;
+        variance.stepBack(h, step);
     }
     second[0] = second[n_ - 1] = 0.0;
     return quality;

@@ -34,6 +34,7 @@ private:
     };
     struct Step;
     struct Triangle;
+    struct Covariance;
 
     double spacing(int32_t i) const { return (x_[i + 1] - x_[i]) / unitOfX_; }
     double deviation(int32_t i) const { return d_ == nullptr ? 1.0 : d_[i] / unitOfD_; }
