@@ -17,7 +17,7 @@ class BandedTriangle {
 public:
     BandedTriangle(DBL *elements, int32_t order, int32_t band)
         : elements_(elements), order_(order), band_(band) {
-        std::fill(row(0), row(0) + std::ptrdiff_t{order} * (band + 1), 0.0);
+        Fill(row(0), std::ptrdiff_t{order} * (band + 1), 0.0);
     }
     // Element (i, i + j), j < band; at j = band the target.
     DBL *row(int32_t i) const { return elements_ + std::ptrdiff_t{i} * (band_ + 1); }
@@ -96,7 +96,7 @@ double ScaleOfWeights(const DBL *w, int32_t n) {
 
 void MakeKnots(const DBL *x, int32_t n, int32_t degree, int32_t interior, const DBL *given,
                DBL *knots) {
-    std::fill(knots, knots + degree + 1, x[0]);
+    Fill(knots, degree + 1, x[0]);
     DBL *const inner = knots + degree + 1;
     for (int32_t i = 0; i < interior; ++i) {
         if (given != nullptr) {
@@ -108,7 +108,7 @@ void MakeKnots(const DBL *x, int32_t n, int32_t degree, int32_t interior, const 
         const double share = position - below;
         inner[i] = std::min(x[below] + share * (x[below + 1] - x[below]), x[below + 1]);
     }
-    std::fill(inner + interior, inner + interior + degree + 1, x[n - 1]);
+    Fill(inner + interior, degree + 1, x[n - 1]);
 }
 
 ErrorCode FitBSpline(const DBL *x, const DBL *y, const DBL *w, int32_t n, int32_t degree,

@@ -30,7 +30,7 @@ bool HasFullRank(const Elimination &triangle, int32_t k) {
 // lengths[i] = the length of row i of R^-1, whose elements solve v R = e_i'. v: k elements of work.
 void RowLengthsOfInverse(const Elimination &triangle, int32_t k, DBL *v, DBL *lengths) {
     for (int32_t i = 0; i < k; ++i) {
-        std::fill(v, v + k, 0.0);
+        Fill(v, k, 0.0);
         v[i] = 1.0;
         double squares = 0.0, scale = 0.0;
         for (int32_t j = i; j < k; ++j) {
@@ -50,7 +50,7 @@ void RowLengthsOfInverse(const Elimination &triangle, int32_t k, DBL *v, DBL *le
 void RowLengthsThroughTriangle(const Elimination &triangle, int32_t k, const RowBlock &block,
                                DBL *lengths) {
     const int32_t count = block.count;
-    std::fill(lengths, lengths + count, 0.0);
+    Fill(lengths, count, 0.0);
     for (int32_t j = 0; j < k; ++j) {
         DBL *const column = block.column(j);
         for (int32_t i = 0; i < j; ++i) {

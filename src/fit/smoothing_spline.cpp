@@ -88,6 +88,13 @@ double LastNotAbove(const Function &f, double low, double atLow, double high, do
     }
 }
 
+double Largest(const DBL *x, int32_t n) {
+    double largest = x[0];
+    for (int32_t i = 1; i < n; ++i)
+        largest = std::max<double>(largest, x[i]);
+    return largest;
+}
+
 } // namespace
 
 ErrorCode SmoothingSpline::make(const DBL *x, const DBL *y, const DBL *d, int32_t n) {
@@ -96,7 +103,7 @@ ErrorCode SmoothingSpline::make(const DBL *x, const DBL *y, const DBL *d, int32_
     d_ = d;
     n_ = n;
     unitOfX_ = (x[n - 1] - x[0]) / (n - 1);
-    unitOfD_ = d == nullptr ? 1.0 : *std::max_element(d, d + n);
+    unitOfD_ = d == nullptr ? 1.0 : Largest(d, n);
     if (const ErrorCode failed = memory_.take(Sized(rest_, n), Sized(steps_, int64_t{n} - 1)))
         return failed;
     takeOffLine();
@@ -371,7 +378,7 @@ void SmoothingSpline::fit(Smoothing method, double parameter, DBL *values, DBL *
         inside = parameter == 0.0 ? 0.0 : within(parameter * unitOfD_ * unitOfD_, values, second);
     *lambda = method == Smoothing::Given ? parameter : inside / unit;
     if (inside == kInfinity) {
-        std::fill(second, second + n_, 0.0);
+        Fill(second, n_, 0.0);
         for (int32_t i = 0; i < n_; ++i)
             values[i] = onLine(i);
         *lambda = kInfinity;
@@ -380,7 +387,8 @@ void SmoothingSpline::fit(Smoothing method, double parameter, DBL *values, DBL *
     }
     if (inside < 1e-280) {
         interpolate(second);
-        std::copy(y_, y_ + n_, values);
+        for (int32_t i = 0; i < n_; ++i)
+            values[i] = y_[i];
         *effective = n_;
     } else {
         *effective = solve(inside, values, second).effective;

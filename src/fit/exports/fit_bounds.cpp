@@ -119,7 +119,7 @@ Outcome Bounds(const FittedModel &model, In<DBL1D> coefficients, double confiden
     if (const Outcome bad = Sized(out, model.linear.n, count))
         return bad;
     DBL *const low = out.lowerCoefficients.data(), *const high = out.upperCoefficients.data();
-    std::fill(high, high + count, 0.0);
+    Fill(high, count, 0.0);
     if (const ErrorCode failed = BoundsOfFit(model, confidence, BoundsOf::Curve, high,
                                              out.lower.data(), out.upper.data()))
         return failed;
@@ -201,11 +201,11 @@ Outcome PolynomialBounds(In<DBL1D> x, const Samples &samples, double confidence,
     const auto writeRows = [&](const RowBlock &block) {
         const DBL *const from = x.data() + block.first;
         DBL *const value = block.column(k);
-        std::fill(value, value + block.count, c[terms - 1]);
+        Fill(value, block.count, c[terms - 1]);
         for (int32_t j = terms - 2; j >= 0; --j)
             for (int32_t i = 0; i < block.count; ++i)
                 value[i] = value[i] * from[i] + c[j];
-        std::fill(block.start, block.start + block.count, 1.0);
+        Fill(block.start, block.count, 1.0);
         for (int32_t j = 1; j < k; ++j)
             for (int32_t i = 0; i < block.count; ++i)
                 block.column(j)[i] = block.column(j - 1)[i] * from[i];
@@ -230,7 +230,7 @@ Outcome MatrixBounds(In<DBL2D> h, const Samples &samples, double confidence, con
     const auto writeRows = [&](const RowBlock &block) {
         TransposeInto(h.data() + std::ptrdiff_t{block.first} * k, block.count, k, block.start);
         DBL *const value = block.column(k);
-        std::fill(value, value + block.count, 0.0);
+        Fill(value, block.count, 0.0);
         for (int32_t j = 0; j < k; ++j)
             for (int32_t i = 0; i < block.count; ++i)
                 value[i] += block.column(j)[i] * c[j];

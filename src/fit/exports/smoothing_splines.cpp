@@ -26,8 +26,9 @@ ErrorCode CheckSmoothing(In<DBL1D> x, In<DBL1D> y, In<DBL1D> d, int32_t method, 
                               (isUsed && std::isinf(parameter) && parameter > 0.0),
                           ErrNonFiniteInput}}))
         return failed;
-    if (!d.isEmpty() && std::any_of(d.data(), d.data() + n, [](double v) { return v <= 0.0; }))
-        return ErrNotStrictlyPositive;
+    for (const double deviation : d.view())
+        if (deviation <= 0.0)
+            return ErrNotStrictlyPositive;
     if (isUsed && !(parameter >= 0.0))
         return ErrNegativeSetting;
     for (int32_t i = 1; i < n; ++i)
@@ -60,8 +61,9 @@ Outcome Smooth(In<DBL1D> x, In<DBL1D> y, In<DBL1D> d, int32_t method, double par
     if (const Outcome bad = coefficients.resize(n - 1, 4))
         return bad;
     if (n < 3) {
-        std::copy(y.data(), y.data() + n, values.data());
-        std::fill(second.data(), second.data() + n, 0.0);
+        for (int32_t i = 0; i < n; ++i)
+            values.data()[i] = y.data()[i];
+        Fill(second.data(), n, 0.0);
         lambda = 0.0;
         effective = n;
     } else {
@@ -73,6 +75,13 @@ Outcome Smooth(In<DBL1D> x, In<DBL1D> y, In<DBL1D> d, int32_t method, double par
     }
     PiecesOf(x.data(), values.data(), second.data(), n, coefficients.data());
     return 0;
+}
+
+bool DoesNotFall(ConstRealVector x) {
+    for (std::ptrdiff_t i = 1; i < x.size(); ++i)
+        if (x[i] < x[i - 1])
+            return false;
+    return true;
 }
 
 bool KnotsAreInside(In<DBL1D> knots, int32_t degree, double first, double last) {
@@ -98,7 +107,7 @@ Outcome FitSpline(In<DBL1D> x, In<DBL1D> y, In<DBL1D> w, int32_t degree, int32_t
                           ErrNonFiniteInput}}))
         return failed;
     const int32_t inner = given.isEmpty() ? interior : given.size();
-    if (!std::is_sorted(x.data(), x.data() + n) ||
+    if (!DoesNotFall(x.view()) ||
         (!given.isEmpty() && !KnotsAreInside(given, degree, x.data()[0], x.data()[n - 1])))
         return ErrAbscissaeOrder;
     if (int64_t{inner} + degree + 1 > n)
