@@ -1,0 +1,108 @@
+#include "tests/codes/witnesses.h"
+
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <set>
+
+// Every code that an export documents is raised by it, and of two faults at once the code that
+// comes first in the documentation. How each is raised is data (witnesses.txt), found by
+// find_codes:
+//
+//     build/release/find_codes build/release/libqxanalysis.so > tests/codes/witnesses.txt
+//
+// with --only EXPORT for one export.
+
+namespace qx::test {
+
+namespace {
+
+struct WithoutWitness {
+    std::string export_;
+    ErrorCode code;
+};
+
+std::vector<WithoutWitness> ReadExceptions() {
+    std::vector<WithoutWitness> found;
+    for (const std::string &line : LinesOf(QX_NOT_RAISED)) {
+        const std::vector<std::string> fields = FieldsOf(line);
+        if (fields.size() != 3 || fields[2].empty() || AllCodes().count(fields[1]) == 0)
+            throw std::invalid_argument("not an export, a code and a reason: " + line);
+        found.push_back({fields[0], AllCodes().at(fields[1])});
+    }
+    return found;
+}
+
+// What is found by running the witnesses, once for all tests.
+class Codes : public testing::Test {
+protected:
+    static void SetUpTestSuite() {
+        ASSERT_NE(BindExports(QX_MODULE), nullptr) << QX_MODULE;
+        for (const std::string &line : LinesOf(QX_WITNESSES)) {
+            const Witness witness = ReadWitness(line);
+            const SpoiltRun run = RunSpoilt(*witness.recipe, witness.n, witness.spoils);
+            const std::string name = witness.recipe->exportName();
+            raised[name].insert(run.codes.begin(), run.codes.end());
+            const bool raises = witness.later == 0
+                                    ? run.hasRaised(witness.code)
+                                    : !run.codes.empty() && run.codes.front() == witness.code;
+            if (!run.applied || !raises)
+                wrong += "\n" + line + ": gives " +
+                         (run.codes.empty() ? "nothing" : std::to_string(run.codes.front()));
+            if (witness.later == 0)
+                witnessed[name].insert(witness.code);
+            else if (!isInOrder(name, witness.code, witness.later))
+                wrong += "\n" + line + ": the documentation has them in another order";
+        }
+    }
+    static bool isInOrder(const std::string &name, ErrorCode first, ErrorCode later) {
+        const std::vector<ErrorCode> &codes = ExportOf(name)->codes;
+        return std::find(codes.begin(), codes.end(), first) <
+               std::find(codes.begin(), codes.end(), later);
+    }
+
+    static std::string wrong;
+    static std::map<std::string, std::set<ErrorCode>> witnessed, raised;
+};
+std::string Codes::wrong;
+std::map<std::string, std::set<ErrorCode>> Codes::witnessed, Codes::raised;
+
+TEST_F(Codes, AreRaisedAsTheWitnessesSayAndInTheOrderOfTheDocumentation) { EXPECT_EQ(wrong, ""); }
+
+// Lack of memory and refused resizes belong to the conformance tests, exports without a recipe to
+// tests of their own.
+TEST_F(Codes, AreEachWitnessedOrListedWithAReason) {
+    std::map<std::string, std::set<ErrorCode>> exceptions;
+    for (const WithoutWitness &one : ReadExceptions())
+        exceptions[one.export_].insert(one.code);
+    std::set<std::string> exempt;
+    for (const Exempt &one : ExemptExports())
+        exempt.insert(one.name);
+    for (const Interceptable &target : AllInterceptable()) {
+        if (exempt.count(target.name) != 0)
+            continue;
+        for (const ErrorCode code : target.codes)
+            if (code != ErrOutOfMemory) {
+                EXPECT_EQ(witnessed[target.name].count(code) + exceptions[target.name].count(code),
+                          1U)
+                    << target.name << " | " << NameOf(code)
+                    << ": a witness is needed (find_codes), or a reason in " QX_NOT_RAISED;
+            }
+    }
+}
+
+TEST_F(Codes, WithoutWitnessAreDocumentedAndNotRaised) {
+    for (const WithoutWitness &one : ReadExceptions()) {
+        const Interceptable *target = ExportOf(one.export_);
+        ASSERT_NE(target, nullptr) << one.export_;
+        EXPECT_NE(std::find(target->codes.begin(), target->codes.end(), one.code),
+                  target->codes.end())
+            << one.export_ << " does not document " << NameOf(one.code);
+        EXPECT_EQ(raised[one.export_].count(one.code), 0U)
+            << one.export_ << " raises " << NameOf(one.code);
+    }
+}
+
+} // namespace
+
+} // namespace qx::test

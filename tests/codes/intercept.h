@@ -1,0 +1,102 @@
+#ifndef QX_TESTS_CODES_INTERCEPT_H
+#define QX_TESTS_CODES_INTERCEPT_H
+
+#include "qx/types.h"
+#include "tests/compare/trampolines.h"
+#include "tests/fuzz/thunk.h"
+#include "tests/support/recipe.h"
+
+#include <cstring>
+#include <map>
+#include <string>
+#include <vector>
+
+namespace qx::test {
+
+// Calls on their way from a recipe to the module. A recipe makes valid arguments; spoils change
+// some of them, named as in the declaration, before the module sees them.
+
+enum class ArgumentKind { Array1D, Array2D, Array3D, Number, Record, Error, Other };
+
+struct InterceptedArgument {
+    const char *name;
+    ArgumentKind kind;
+    bool isByValue, isInput, isOutput; // neither of the two last: both ways
+    std::string element;               // of the host, or a record's name
+};
+
+struct Interceptable {
+    const char *name;
+    int32_t (*real)(const Value *);
+    bool returnsCode;
+    std::vector<ErrorCode> codes; // in the order of the documentation
+    std::vector<InterceptedArgument> arguments;
+};
+
+struct LayoutField {
+    const char *name;
+    std::size_t offset;
+    int dimensions; // of an array; 0 for a number
+    std::string element;
+};
+struct RecordLayout {
+    std::size_t size;
+    std::vector<LayoutField> fields;
+};
+
+// What the build writes from the catalogue.
+const std::vector<Interceptable> &AllInterceptable();
+const std::map<std::string, RecordLayout> &AllLayouts();
+const std::map<std::string, ErrorCode> &AllCodes();
+
+int32_t Intercepted(const Interceptable &target, Value *values);
+
+template <class T>
+void *Untyped(T pointer) {
+    void *plain;
+    static_assert(sizeof pointer == sizeof plain);
+    std::memcpy(&plain, &pointer, sizeof plain);
+    return plain;
+}
+template <class T>
+T Typed(void *plain) {
+    T pointer;
+    std::memcpy(&pointer, &plain, sizeof pointer);
+    return pointer;
+}
+
+// A change of one argument, or of a field "record.field":
+//     x size 0          a size 3x2           new elements repeat the old ones
+//     x fill nan        x at 2 -1            numbers; of a complex element both parts
+//     x scale 1e300     x first              0 but for the first element
+//     x up    x down    ascending or descending whole numbers
+//     order = -1        y is x               another value; the same array
+struct Spoil {
+    std::string place, action;
+    bool operator==(const Spoil &) const = default;
+};
+typedef std::vector<Spoil> Spoils;
+std::string Written(const Spoils &spoils);
+Spoils ReadSpoils(const std::string &text);
+
+// What can be spoilt in a call, as it was before.
+struct SpoilPlace {
+    std::string name;
+    int dimensions; // of an array; 0 for a number
+    std::string element;
+    std::vector<int32_t> sizes;
+    double value; // of a number
+};
+
+// Runs a recipe and spoils the arguments of each call of its export.
+struct SpoiltRun {
+    std::vector<ErrorCode> codes;   // of its calls
+    std::vector<SpoilPlace> places; // of the first call
+    bool applied = true;            // whether each spoil had its place
+    bool hasRaised(ErrorCode code) const;
+};
+SpoiltRun RunSpoilt(const Recipe &recipe, int32_t n, const Spoils &spoils);
+
+} // namespace qx::test
+
+#endif
