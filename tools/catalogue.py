@@ -413,7 +413,8 @@ def find_values(export, by_name, introductions):
 
 def resolve(export, by_name, path=()):
     """Puts into an export what it takes over from others: "inherited", the names from which it has
-    text, nearest first, "codes" and "hostStatus"."""
+    text, nearest first, "codes", "checks" (the codes in the order in which they are raised, one that
+    is raised in several places several times) and "hostStatus"."""
     if "codes" in export:
         return
     if export["name"] in path:
@@ -434,8 +435,9 @@ def resolve(export, by_name, path=()):
     export["hostStatus"] = False
     for kind, name in raised:
         export["hostStatus"] |= kind == "host" or kind == "those of" and other(name)["hostStatus"]
-        codes += [name] if kind == "code" else other(name)["codes"] if kind == "those of" else []
+        codes += [name] if kind == "code" else other(name)["checks"] if kind == "those of" else []
     export["codes"] = list(dict.fromkeys(codes))
+    export["checks"] = codes
     if export["hasStatus"] and not (codes or export["hostStatus"] or export["saysNone"]):
         raise ValueError("has a status, but its documentation has no sentence 'Codes: ...'")
     export.pop("saysNone")

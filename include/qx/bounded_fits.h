@@ -70,14 +70,15 @@ QX_API ErrorCode BoundLinearFitBi_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DB
     ends. It ends in the minimum that its start leads to, with some 8 digits of the coefficients
     where the tolerance is 1e-14. D. W. Marquardt, "An algorithm for least-squares estimation of
     nonlinear parameters", 1963. Codes: ErrSizeMismatch (x or w does not fit y), ErrSizesDisagree
-    (lower or upper are too short, or they differ in length), ErrNaNInData (a bound is NaN, or the
-    residuals at the start are), ErrFitPointsTooFew (fewer samples than free coefficients),
-    ErrOutOfMemory (no memory), ErrInvalidSelector (method is above 2), ErrNonFiniteInput (a weight
-    or a sample is NaN or infinite, or the cost is at the start and at the next point),
+    (lower or upper are too short, or they differ in length), ErrNaNInData (a bound is NaN),
+    ErrFitPointsTooFew (fewer samples than free coefficients), ErrOutOfMemory (no memory),
+    ErrInvalidSelector (method is above 2), ErrNonFiniteInput (a weight is NaN or infinite),
     ErrTooFewWeights (fewer weights other than 0 than coefficients), ErrPolynomialOrderTooHigh
     (fewer than two values lie on one side of the estimated c, so that there is no start),
-    ErrIterationLimit (the singular values of the start do not converge), ErrBoundsCrossed (a lower
-    bound is above its upper one), ErrSingularMatrix (a step is not determined), WarnFitIncomplete
+    ErrNonFiniteInput (a sample is NaN or infinite), ErrIterationLimit (the singular values of the
+    start do not converge), ErrNaNInData (the residuals at the start are NaN), ErrNonFiniteInput
+    (the cost is NaN or infinite at the start and at the next point), ErrSingularMatrix (a step is
+    not determined), ErrBoundsCrossed (a lower bound is above its upper one), WarnFitIncomplete
     (guess is too short). */
 QX_API ErrorCode BoundExpFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, double tolerance,
                                   QX_INOUT int32_t *iterations, QX_IN DBL1D guess,
@@ -88,15 +89,16 @@ QX_API ErrorCode BoundExpFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w
 /** As BoundExpFit_head, for y = a x^b + c with x above 0, with at most 30 steps without bounds. By
     least squares all steps are made without bounds first; where a bound cuts off the answer, up to
     as many follow within the bounds. Codes: ErrSizeMismatch (x or w does not fit y),
-    ErrSizesDisagree (lower or upper are too short, or they differ in length), ErrNaNInData (a
-    bound is NaN, or the residuals at the start are), ErrFitPointsTooFew (fewer samples than free
-    coefficients), ErrOutOfMemory (no memory), ErrInvalidSelector (method is above 2),
-    ErrNonFiniteInput (a weight or a sample is NaN or infinite, or the cost is at the start and at
-    the next point), ErrTooFewWeights (fewer weights other than 0 than coefficients),
-    ErrNotStrictlyPositive (an x is 0 or below), ErrPolynomialOrderTooHigh (fewer than two values
-    lie on one side of the estimated c, so that there is no start), ErrIterationLimit (the singular
-    values of the start do not converge), ErrBoundsCrossed (a lower bound is above its upper one),
-    ErrSingularMatrix (a step is not determined), WarnFitIncomplete (guess is too short). */
+    ErrSizesDisagree (lower or upper are too short, or they differ in length), ErrNaNInData (a bound
+    is NaN), ErrFitPointsTooFew (fewer samples than free coefficients), ErrOutOfMemory (no memory),
+    ErrInvalidSelector (method is above 2), ErrNonFiniteInput (a weight is NaN or infinite),
+    ErrTooFewWeights (fewer weights other than 0 than coefficients), ErrNotStrictlyPositive (an x
+    is 0 or below), ErrPolynomialOrderTooHigh (fewer than two values lie on one side of the
+    estimated c, so that there is no start), ErrNonFiniteInput (a sample is NaN or infinite),
+    ErrIterationLimit (the singular values of the start do not converge), ErrNaNInData (the
+    residuals at the start are NaN), ErrNonFiniteInput (the cost is NaN or infinite at the start
+    and at the next point), ErrSingularMatrix (a step is not determined), ErrBoundsCrossed (a lower
+    bound is above its upper one), WarnFitIncomplete (guess is too short). */
 QX_API ErrorCode BoundPowerFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w,
                                     double tolerance, QX_INOUT int32_t *iterations,
                                     QX_IN DBL1D guess, QX_IN DBL1D lower, QX_IN DBL1D upper,
@@ -109,13 +111,13 @@ QX_API ErrorCode BoundPowerFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D
     code 0: the mse for y from 1e154 on, and b and the values, as in LogFit_head, where x are equal,
     the base is 1 or y hardly depends on x. Codes: ErrSizeMismatch (x or w does not fit y),
     ErrSizesDisagree (lower or upper have one element, or they differ in length), ErrNaNInData (a
-    bound is NaN, or a residual is), ErrFitPointsTooFew (fewer samples than free coefficients),
-    ErrNonFiniteInput (a weight is NaN or infinite, or the cost is at the start and at the next
-    point, or a single x times the fixed b is 0 or below), ErrInvalidSelector (method is above 2),
-    ErrMixedSigns (an x is 0 or below), ErrTooFewWeights (only one weight is not 0),
-    ErrNotStrictlyPositive (base is 0 or below), ErrOutOfMemory (no memory), ErrBoundsCrossed (a
-    lower bound is above its upper one), ErrSingularMatrix (a step is not determined),
-    WarnFitIncomplete (guess has one element). */
+    bound is NaN), ErrFitPointsTooFew (fewer samples than free coefficients), ErrNonFiniteInput (a
+    single x times the fixed b is 0 or below), ErrInvalidSelector (method is above 2), ErrMixedSigns
+    (an x is 0 or below), ErrNonFiniteInput (a weight is NaN or infinite), ErrTooFewWeights (only
+    one weight is not 0), ErrNotStrictlyPositive (base is 0 or below), ErrOutOfMemory (no memory),
+    ErrBoundsCrossed (a lower bound is above its upper one), ErrNaNInData (a residual is NaN),
+    ErrNonFiniteInput (the cost is NaN or infinite at the start and at the next point),
+    ErrSingularMatrix (a step is not determined), WarnFitIncomplete (guess has one element). */
 QX_API ErrorCode BoundLogFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, double base,
                                   QX_INOUT int32_t *iterations, QX_IN DBL1D guess,
                                   QX_IN DBL1D lower, QX_IN DBL1D upper, uint16_t method,
@@ -126,13 +128,13 @@ QX_API ErrorCode BoundLogFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w
     without its sign. Bounds of bad length are left out without a word, and so is a guess that does
     not begin with a finite value. Without a guess the fit starts at the peak on the lowest level
     of the data or at the dip in the highest. Codes: ErrSizeMismatch (x or w does not fit y),
-    ErrNaNInData (a bound is NaN, or the residuals at the start are), ErrFitPointsTooFew (fewer
-    samples than free coefficients), ErrOutOfMemory (no memory), ErrInvalidSelector (method is
-    above 2), ErrNonFiniteInput (a weight or a sample is NaN or infinite, or the cost is at the
-    start and at the next point), ErrTooFewWeights (fewer weights other than 0 than coefficients),
-    ErrNoUsableFit (neither a peak nor a dip to start from), ErrFitStartValues (s starts at 0),
-    ErrBoundsCrossed (a lower bound is above its upper one), ErrSingularMatrix (a step is not
-    determined), WarnFitIncomplete (guess is too short). */
+    ErrNaNInData (a bound is NaN), ErrFitPointsTooFew (fewer samples than free coefficients),
+    ErrOutOfMemory (no memory), ErrInvalidSelector (method is above 2), ErrNonFiniteInput (a weight
+    is NaN or infinite), ErrTooFewWeights (fewer weights other than 0 than coefficients),
+    ErrNoUsableFit (no guess, and neither a peak nor a dip to start from), ErrFitStartValues (s
+    starts at 0), ErrNaNInData (the residuals at the start are NaN), ErrNonFiniteInput (the cost is
+    NaN or infinite at the start and at the next point), ErrSingularMatrix (a step is not
+    determined), ErrBoundsCrossed (a lower bound is above its upper one), WarnFitIncomplete (guess is too short). */
 QX_API ErrorCode BoundGaussianFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w,
                                        double tolerance, QX_INOUT int32_t *iterations,
                                        QX_IN DBL1D guess, QX_IN DBL1D lower, QX_IN DBL1D upper,

@@ -78,8 +78,8 @@ QX_API ErrorCode NumerIntegration3D_2017_head(QX_IN DBL3D x, QX_IN DBL1D dts, ui
 
 /** Running integral by Simpson's rule around each sample,
     y[i] = y[i-1] + (x[i-1] + 4 x[i] + x[i+1]) dt/6, with *initial before and *final behind the
-   data. Codes: ErrSamplingNotPositive (*dt is 0 or below), ErrEmptyInput (x is empty; over the
-   other). */
+   data. Codes: ErrEmptyInput (x is empty), ErrSamplingNotPositive (*dt is 0 or
+   below). */
 QX_API int32_t Integral(QX_INOUT DBL1D x, QX_IN const double *initial, QX_IN const double *final,
                         QX_IN const double *dt, QX_OUT ErrorCode *err);
 
@@ -92,9 +92,9 @@ QX_API int32_t Integral(QX_INOUT DBL1D x, QX_IN const double *initial, QX_IN con
         4  x[i-1] dt, from y[0] = 0                                    none
         5  x[i] dt, from y[0] = 0                                      none
 
-    Codes: ErrSamplingNotPositive (dt is 0 or below), ErrEmptyInput (x is empty, or one value is
-    missing), ErrFewerThanTwo (one of two values is missing), ErrInvalidSelector (the rule is
-    another). */
+    Codes: ErrSamplingNotPositive (dt is 0 or below), ErrEmptyInput (x is empty),
+    ErrInvalidSelector (the rule is another), ErrEmptyInput (one value is missing), ErrFewerThanTwo
+    (one of two values is missing). */
 QX_API ErrorCode Integral90(QX_INOUT DBL1D x, QX_IN DBL1D initial, QX_IN DBL1D final, double dt,
                             int32_t rule);
 
@@ -106,8 +106,7 @@ QX_API ErrorCode Integral90(QX_INOUT DBL1D x, QX_IN DBL1D initial, QX_IN DBL1D f
 QX_API ErrorCode Integral_2017(QX_INOUT DBL1D x, double dt, int32_t rule);
 
 /** Central derivative (x[i+1] - x[i-1]) / (2 dt), with *initial before and *final behind the data.
-    Codes: ErrEmptyInput (x is empty), ErrSamplingNotPositive (*dt is not above 0; over the
-    other). */
+    Codes: ErrSamplingNotPositive (*dt is not above 0), ErrEmptyInput (x is empty). */
 QX_API int32_t Derivative(QX_INOUT DBL1D x, QX_IN const double *initial, QX_IN const double *final,
                           QX_IN const double *dt, QX_OUT ErrorCode *err);
 
@@ -118,9 +117,9 @@ QX_API int32_t Derivative(QX_INOUT DBL1D x, QX_IN const double *initial, QX_IN c
         2  (x[i+1] - x[i]) / dt                                        one final
         3  (x[i] - x[i-1]) / dt                                        one initial
 
-    Codes: ErrEmptyInput (x is empty), ErrSamplingNotPositive (*dt is 0 or below), ErrEmptyInput
-    (rules 0, 2 and 3: a value is missing), ErrFewerThanTwo (rule 1: one of two values is missing),
-    ErrInvalidSelector (the rule is another). */
+    Codes: ErrEmptyInput (x is empty), ErrSamplingNotPositive (*dt is 0 or below),
+    ErrInvalidSelector (the rule is another), ErrEmptyInput (rules 0, 2 and 3: a value is missing),
+    ErrFewerThanTwo (rule 1: one of two values is missing). */
 QX_API ErrorCode Derivative85(QX_INOUT DBL1D x, QX_IN DBL1D initial, QX_IN DBL1D final,
                               QX_IN const double *dt, int32_t rule);
 

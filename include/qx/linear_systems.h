@@ -4,8 +4,9 @@
 /* Linear systems, least squares and inverses.
 
    Matrices are blocks of rows and columns, row after row. The exports with *err have the function
-   result 0 and run all their checks, of which the last failed one decides; those without return
-   the code of the first failed check. A failure empties the outputs. */
+   result 0 and run all their checks, of which the last failed one
+   decides, so that their codes begin with it; those without return the code of the first failed
+   check. A failure empties the outputs. */
 
 #include "qx/matrix_factorisations.h"
 
@@ -13,8 +14,8 @@ QX_BEGIN_DECLS
 
 /** Solves a x = b for a square a by LU factorisation with row exchanges. A refused resize gives
     the host's own status as the function result. Non-finite data are not looked for.
-    Codes: ErrEmptyInput (a or b is empty), ErrNotSquare (a is not square), ErrSizeMismatch (b has
-    not as many elements as a has rows), ErrOutOfMemory (no memory, or the host refused the
+    Codes: ErrSizeMismatch (b has not as many elements as a has rows), ErrNotSquare (a is not
+    square), ErrEmptyInput (a and b are empty), ErrOutOfMemory (no memory, or the host refused the
     resize), ErrSingularMatrix (a column has no pivot but 0). */
 QX_API int32_t EqsByLUDri_head(QX_IN DBL2D a, QX_IN DBL1D b, QX_OUT DBL1D x, QX_OUT ErrorCode *err);
 /** As EqsByLUDri_head, for complex data. */
@@ -32,8 +33,8 @@ QX_API ErrorCode CxEqsSetByLUDri_head(QX_IN CDB2D a, QX_IN CDB2D b, QX_OUT CDB2D
 
 /** Solves in place of b with the factors and pivots of LU_head. A zero on the diagonal gives
     infinities or NaN.
-    Codes: ErrEmptyInput (lu, pivots or b is empty), ErrNotSquare (lu is not square),
-    ErrSizeMismatch (pivots or b has not as many elements as lu has rows), ErrIndexOutOfRange (a
+    Codes: ErrSizeMismatch (pivots or b has not as many elements as lu has rows), ErrNotSquare (lu
+    is not square), ErrEmptyInput (lu, pivots and b are empty), ErrIndexOutOfRange (a
     pivot is no row of lu). */
 QX_API int32_t LULinEqs_head(QX_IN DBL2D lu, QX_IN I32_1D pivots, QX_INOUT DBL1D b,
                              QX_OUT ErrorCode *err);
@@ -50,8 +51,8 @@ QX_API int32_t CxInvMatrixLUDri_head(QX_INOUT CDB2D a, QX_OUT ErrorCode *err);
 
 /** Inverse from the factors and pivots of LU_head, in place of the factors. A zero on the diagonal
     gives infinities or NaN.
-    Codes: ErrEmptyInput (lu or pivots is empty), ErrNotSquare (lu is not square), ErrSizeMismatch
-    (pivots has not as many elements as lu has rows), ErrOutOfMemory (no memory),
+    Codes: ErrSizeMismatch (pivots has not as many elements as lu has rows), ErrNotSquare (lu is
+    not square), ErrEmptyInput (lu and pivots are empty), ErrOutOfMemory (no memory),
     ErrIndexOutOfRange (a pivot is no row of lu). */
 QX_API int32_t LUInvMatrix_head(QX_INOUT DBL2D lu, QX_IN I32_1D pivots, QX_OUT ErrorCode *err);
 /** As LUInvMatrix_head, for complex data. */
@@ -63,9 +64,10 @@ QX_API int32_t CxLUInvMatrix_head(QX_INOUT CDB2D lu, QX_IN I32_1D pivots, QX_OUT
     up to about 2.2e-16 times the condition number divided by the norm, for a condition number of
     1000 measured 3e-9 at a norm of 1e-4, 3e-5 at 1e-8 and 0.3 at 1e-12; scale a and b up. A refused
     resize gives the host's own status as the function result.
-    Codes: ErrEmptyInput (a or b is empty), ErrSizeMismatch (b has not as many elements as a has
-    rows), ErrOutOfMemory (no memory, or the host refused the resize), ErrNonFiniteInput (a or b
-    holds NaN or infinity), ErrIterationLimit (the singular values do not converge). */
+    Codes: ErrSizeMismatch (b has not as many elements as a has rows), ErrEmptyInput (a has no
+    column, or a and b are empty), ErrOutOfMemory (no memory, or the host refused the resize),
+    ErrNonFiniteInput (a or b holds NaN or infinity), ErrIterationLimit (the singular values do not
+    converge). */
 QX_API int32_t GenLinEqs_head(QX_IN DBL2D a, QX_IN DBL1D b, QX_OUT DBL1D x, QX_OUT ErrorCode *err);
 /** As GenLinEqs_head, for complex data. */
 QX_API int32_t CxGenLinEqs_head(QX_IN CDB2D a, QX_IN CDB1D b, QX_OUT CDB1D x,
@@ -120,8 +122,8 @@ QX_API ErrorCode CxEqsSetBySVDDri82_head(QX_IN CDB2D a, QX_IN CDB2D b, QX_OUT CD
 
 /** Solves a x = b for a positive definite a by Cholesky factorisation, of which the upper triangle
     is read.
-    Codes: ErrEmptyInput (a or b is empty), ErrNotSquare (a is not square), ErrSizeMismatch (b has
-    not as many elements as a has rows), ErrOutOfMemory (no memory, or the host refused the
+    Codes: ErrSizeMismatch (b has not as many elements as a has rows), ErrNotSquare (a is not
+    square), ErrEmptyInput (a and b are empty), ErrOutOfMemory (no memory, or the host refused the
     resize), ErrNonFiniteInput (a or b holds NaN or infinity), ErrNotPositiveDefinite (a is not
     positive definite, or nearly not). */
 QX_API int32_t EqsByCholeskyDri_head(QX_IN DBL2D a, QX_IN DBL1D b, QX_OUT DBL1D x,
@@ -131,7 +133,11 @@ QX_API int32_t CxEqsByCholeskyDri_head(QX_IN CDB2D a, QX_IN CDB1D b, QX_OUT CDB1
                                        QX_OUT ErrorCode *err);
 
 /** As EqsByCholeskyDri_head, for all columns of b, with the upper triangle of a if useUpper is not
-    0, else the lower one. The code is the function result. */
+        0, else the lower one. The code is the function result.
+    Codes: ErrEmptyInput (a or b is empty), ErrNotSquare (a is not square), ErrSizeMismatch (b has
+    not as many rows as a), ErrOutOfMemory (no memory, or the host refused the resize),
+    ErrNonFiniteInput (a or b holds NaN or infinity), ErrNotPositiveDefinite (a is not positive
+    definite, or nearly not). */
 QX_API ErrorCode EqsSetByCholeskyDri_head(QX_IN DBL2D a, int32_t useUpper, QX_IN DBL2D b,
                                           QX_OUT DBL2D x);
 /** As EqsSetByCholeskyDri_head, for a Hermitian matrix. */
@@ -139,8 +145,8 @@ QX_API ErrorCode CxEqsSetByCholeskyDri_head(QX_IN CDB2D a, int32_t useUpper, QX_
                                             QX_OUT CDB2D x);
 
 /** Solves L L^T x = b in place of b with a packed lower factor of Cholesky_head.
-    Codes: ErrEmptyInput (packedFactor or b is empty), ErrNotSquare (the length of packedFactor is
-    no n (n+1) / 2), ErrSizeMismatch (b has not n elements). */
+    Codes: ErrNotSquare (packedFactor is empty, or its length is no n (n+1) / 2), ErrSizeMismatch
+    (b has not n elements). */
 QX_API int32_t CholeskyLinEqs_head(QX_IN DBL1D packedFactor, QX_INOUT DBL1D b,
                                    QX_OUT ErrorCode *err);
 /** As CholeskyLinEqs_head, for complex data: L L^H x = b. */
@@ -160,9 +166,8 @@ QX_API ErrorCode CxTriEqsSetDri_head(QX_IN CDB2D a, int32_t triangle, QX_IN CDB2
                                      QX_OUT CDB2D x);
 
 /** As TriEqsSetDri_head, for a packed triangle and in place of b, with the code in *err.
-    Codes: ErrEmptyInput (a or b is empty), ErrNotSquare (the packed length is no n (n+1) / 2),
-    ErrSizeMismatch (b has not n elements), ErrInvalidSelector (triangle is neither 0 nor 1),
-    ErrNonFiniteInput (a or b holds NaN or infinity), ErrSingularMatrix (as there). */
+    Codes: ErrInvalidSelector (triangle is neither 0 nor 1), ErrNotSquare (a is empty, or its
+    length is no n (n+1) / 2), ErrSizeMismatch (b has not n elements), ErrNonFiniteInput (a or b holds NaN or infinity), ErrSingularMatrix (as there). */
 QX_API int32_t TriLinEqs_head(QX_IN const PackedTriangle *a, QX_INOUT DBL1D b,
                               QX_OUT ErrorCode *err);
 /** As TriLinEqs_head, for complex data. */

@@ -57,8 +57,8 @@ QX_API int32_t CxInvMatrixChoDri_head(QX_INOUT CDB2D a, QX_OUT ErrorCode *err);
 
 /** As InvMatrixChoDri_head, without a request for memory: packedWork, of at least n(n+1)/2 elements,
     is the work space. It is neither resized nor emptied.
-    Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrSizeMismatch (packedWork is
-    too short), ErrNotPositiveDefinite (a is not positive definite, or nearly singular). */
+    Codes: ErrSizeMismatch (packedWork is too short), ErrNotSquare (a is not square), ErrEmptyInput
+    (a is empty), ErrNotPositiveDefinite (a is not positive definite, or nearly singular). */
 QX_API int32_t PreallocInvMatrixChoDri_H(QX_INOUT DBL2D a, QX_INOUT DBL1D packedWork,
                                          QX_OUT ErrorCode *err);
 
@@ -74,8 +74,8 @@ typedef struct CxPackedTriangle {
 } CxPackedTriangle;
 
 /** The inverse of a packed triangle, in its place.
-    Codes: ErrEmptyInput (packed is empty), ErrNotSquare (the length is no n(n+1)/2),
-    ErrInvalidSelector (triangle is not 0 or 1), ErrNonFiniteInput (an element is not finite),
+    Codes: ErrInvalidSelector (triangle is not 0 or 1), ErrEmptyInput (packed is empty), ErrNotSquare
+    (the length is no n(n+1)/2), ErrNonFiniteInput (an element is not finite),
     ErrSingularMatrix (a diagonal element is at most 2.2e-16 of the largest element in absolute
     value). */
 QX_API int32_t Tri_InvMatrix_head(QX_INOUT PackedTriangle *a, QX_OUT ErrorCode *err);
@@ -83,8 +83,8 @@ QX_API int32_t Tri_InvMatrix_head(QX_INOUT PackedTriangle *a, QX_OUT ErrorCode *
 QX_API int32_t CxTri_InvMatrix_head(QX_INOUT CxPackedTriangle *a, QX_OUT ErrorCode *err);
 
 /** The inverse of a triangular matrix, in its place. triangle: 0 lower; 1 upper. The other triangle
-   is not read; it becomes 0. Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square),
-   ErrInvalidSelector (*triangle is not 0 or 1), ErrOutOfMemory (no memory), ErrNonFiniteInput (an
+   is not read; it becomes 0. Codes: ErrInvalidSelector (*triangle is not 0 or 1), ErrNotSquare
+   (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory), ErrNonFiniteInput (an
    element is not finite), ErrSingularMatrix (a diagonal element is at most 2.2e-16 of the largest
    element in absolute value). */
 QX_API int32_t InvMatrixTriDri_head(QX_INOUT DBL2D a, QX_IN const int32_t *triangle,
@@ -100,7 +100,7 @@ QX_API int32_t CxInvMatrixTriDri_head(QX_INOUT CDB2D a, QX_IN const int32_t *tri
    m eps, where q goes on with another vector orthogonal to them. All three leave q unitary and a -
    q r small to a few m eps, however ill-conditioned a is. L. Giraud, J. Langou, M. Rozloznik, "On
    the loss of orthogonality in the Gram-Schmidt orthogonalization process", 2005. Codes:
-   ErrEmptyInput (a is empty), ErrInvalidSelector (*algorithm is not 0, 1 or 2), ErrOutOfMemory (no
+   ErrInvalidSelector (*algorithm is not 0, 1 or 2), ErrEmptyInput (a is empty), ErrOutOfMemory (no
    memory), ErrNonFiniteInput (an element is not finite). */
 QX_API int32_t qrd_head(QX_IN DBL2D a, QX_IN const int32_t *algorithm, QX_OUT DBL2D q,
                         QX_OUT DBL2D r, QX_OUT ErrorCode *err);

@@ -36,9 +36,9 @@ QX_API ErrorCode ExpFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D deviat
     takes the best. A guess that is not finite gives NaN. Steps that come back in a cycle, as
     rounding makes them do with a small tolerance, are counted but not repeated.
     Codes: ErrSizeMismatch (the arrays differ in length), ErrFewerThanTwo (less than two samples),
-    ErrNonFiniteInput (a weight is NaN, or a sample or a step's exponential not finite),
-    ErrTooFewWeights (all weights but one are 0), ErrPolynomialOrderTooHigh (less than two values
-    have the sign of most), ErrOutOfMemory (no memory), ErrIterationLimit (singular values do not
+    ErrNonFiniteInput (a weight is NaN), ErrTooFewWeights (all weights but one are 0),
+    ErrPolynomialOrderTooHigh (less than two values have the sign of most), ErrNonFiniteInput (a
+    sample or a step's exponential is not finite), ErrOutOfMemory (no memory), ErrIterationLimit (singular values do not
     converge), WarnFitIncomplete (the guess has neither no values nor two). */
 QX_API ErrorCode ExpFit80_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, double tolerance,
                                QX_IN DBL1D guess, uint16_t method, QX_OUT double *a,
@@ -61,9 +61,9 @@ QX_API ErrorCode ExpFitCoef80_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, 
     that count are all equal, rounding decides, and a or b may be infinite or 0, with the code 0; a
     step may also carry b to an infinity where x^b stays finite.
     Codes: ErrSizeMismatch (the arrays differ in length), ErrFewerThanTwo (less than two samples),
-    ErrNonFiniteInput (a weight is NaN, or a sample or a step's power not finite), ErrTooFewWeights
-    (all weights but one are 0), ErrNotStrictlyPositive (an x is not above 0),
-    ErrPolynomialOrderTooHigh (less than two values have the sign of most), ErrOutOfMemory (no
+    ErrNonFiniteInput (a weight is NaN), ErrTooFewWeights (all weights but one are 0),
+    ErrNotStrictlyPositive (an x is not above 0), ErrPolynomialOrderTooHigh (less than two values
+    have the sign of most), ErrNonFiniteInput (a sample or a step's power is not finite), ErrOutOfMemory (no
     memory), ErrIterationLimit (singular values do not converge), WarnFitIncomplete (the guess has
     neither no values nor two). */
 QX_API ErrorCode PowerFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, double tolerance,
@@ -98,8 +98,8 @@ QX_API ErrorCode LogFitCoef_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, do
     with the code 0. A guess that is not finite counts as none. A peak that alone lies above a tenth
     of its height is taken through three points, and *iterations is 0.
     Codes: ErrSizeMismatch (the arrays differ in length), ErrFewerThanThree (less than three
-    samples), ErrNonFiniteInput (a weight is NaN, or an x not finite), ErrTooFewWeights (less than
-    three weights are not 0), ErrFitStartValues (the deviation to start from is 0, or a lone peak
+    samples), ErrNonFiniteInput (a weight is NaN), ErrTooFewWeights (less than three weights are not
+    0), ErrNonFiniteInput (an x is not finite), ErrFitStartValues (the deviation to start from is 0, or a lone peak
     has no neighbour of its sign on a side), ErrOutOfMemory (no memory), WarnFitIncomplete (the
     guess has neither no values nor three). */
 QX_API ErrorCode GaussianPeakFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w,

@@ -15,8 +15,8 @@ QX_BEGIN_DECLS
    whose row i is the powers of x[i] from the highest to 1; 4 companion of the polynomial with the
     coefficients x, the leading one first: -x[j+1] / x[0] in the first row, ones below the
     diagonal. What a kind does not need is not looked at.
-    Codes: ErrEmptyInput (kinds 0 to 3: the size is below 1), ErrFewerThanTwo (kind 4: x has fewer
-    than 2 elements), ErrInvalidSelector (*kind is not 0 to 4), ErrOutOfMemory (the host refused
+    Codes: ErrInvalidSelector (*kind is not 0 to 4), ErrEmptyInput (kinds 0 to 3: the size is below
+    1), ErrFewerThanTwo (kind 4: x has fewer than 2 elements), ErrOutOfMemory (the host refused
     the resize). */
 QX_API int32_t SpecialMatrix_head(QX_IN const int32_t *kind, QX_IN const int32_t *size,
                                   QX_IN DBL1D x, QX_IN DBL1D y, QX_OUT DBL2D out,

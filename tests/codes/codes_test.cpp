@@ -51,14 +51,9 @@ protected:
                          (run.codes.empty() ? "nothing" : std::to_string(run.codes.front()));
             if (witness.later == 0)
                 witnessed[name].insert(witness.code);
-            else if (!isInOrder(name, witness.code, witness.later))
+            else if (!ExportOf(name)->hasInOrder(witness.code, witness.later))
                 wrong += "\n" + line + ": the documentation has them in another order";
         }
-    }
-    static bool isInOrder(const std::string &name, ErrorCode first, ErrorCode later) {
-        const std::vector<ErrorCode> &codes = ExportOf(name)->codes;
-        return std::find(codes.begin(), codes.end(), first) <
-               std::find(codes.begin(), codes.end(), later);
     }
 
     static std::string wrong;

@@ -128,6 +128,15 @@ std::vector<Spoil> AllSpoils(const Base &base, const std::vector<ErrorCode> &wan
     for (const SpoilPlace &place : base.places)
         for (const std::string &action : ActionsOn(place))
             all.push_back({place.name, action});
+    for (const InterceptedArgument &argument : ExportOf(base.recipe->exportName())->arguments) {
+        const bool isPointer = !argument.isByValue && (argument.kind == ArgumentKind::Record ||
+                                                       argument.kind == ArgumentKind::Number ||
+                                                       argument.kind == ArgumentKind::Word);
+        if (wants(ErrMeasureNullState) && isPointer)
+            all.push_back({argument.name, "null"});
+        if (wants(ErrInternal) && argument.kind == ArgumentKind::Word)
+            all.push_back({argument.name, "foreign"});
+    }
     if (!wants(ErrInternal))
         return all;
     for (const SpoilPlace &place : base.places)
@@ -202,8 +211,9 @@ public:
     // Two faults at once, for each pair of codes.
     void pairs() {
         for (std::size_t i = 0; i < wanted_.size(); ++i)
-            for (std::size_t j = i + 1; j < wanted_.size(); ++j)
-                if (wanted_[i] < 0 && wanted_[j] < 0)
+            for (std::size_t j = 0; j < wanted_.size(); ++j)
+                if (wanted_[i] < 0 && wanted_[j] < 0 && i != j &&
+                    target_.hasInOrder(wanted_[i], wanted_[j]))
                     pair(wanted_[i], wanted_[j]);
     }
     void write() const {
@@ -294,7 +304,7 @@ private:
                     against = &both;
                 }
             }
-        if (against != nullptr)
+        if (against != nullptr && !target_.hasInOrder(later, first))
             std::fprintf(stderr, "LATER WINS: %s\n", Written(*against).c_str());
     }
 

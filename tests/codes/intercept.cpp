@@ -280,8 +280,44 @@ private:
     std::vector<std::vector<unsigned char>> copies_;
 };
 
+// Pointers of a call that are made null, and words of the caller's that hold something else than a
+// cell, until the call is over.
+class SpoiltPointers {
+public:
+    SpoiltPointers(const Interceptable &target, const Spoils &spoils, Value *values) {
+        for (const Spoil &spoil : spoils)
+            for (std::size_t i = 0; i < target.arguments.size(); ++i)
+                if (target.arguments[i].name == spoil.place) {
+                    if (spoil.action == "null")
+                        values[i].pointer = nullptr;
+                    else if (spoil.action == "foreign")
+                        replace(static_cast<void **>(values[i].pointer));
+                }
+    }
+    ~SpoiltPointers() {
+        for (const auto &[word, old] : words_)
+            *word = old;
+    }
+    SpoiltPointers(const SpoiltPointers &) = delete;
+    SpoiltPointers &operator=(const SpoiltPointers &) = delete;
+
+private:
+    void replace(void **word) {
+        words_.push_back({word, *word});
+        *word = &noCell_[1]; // 0 before it is the mark of no kind
+    }
+    uint64_t noCell_[2] = {};
+    std::vector<std::pair<void **, void *>> words_;
+};
+
+bool IsOfPointers(const Spoil &spoil) {
+    return spoil.action == "null" || spoil.action == "foreign";
+}
+
 void SpoilArguments(const Spoils &spoils, const Places &places) {
     for (const Spoil &spoil : spoils) {
+        if (IsOfPointers(spoil))
+            continue;
         const auto place = std::find_if(places.all().begin(), places.all().end(),
                                         [&](const Located &p) { return p.name == spoil.place; });
         active->run.applied &=
@@ -306,6 +342,7 @@ int32_t Intercepted(const Interceptable &target, Value *values) {
     if (active->run.codes.empty())
         Remember(places);
     SpoilArguments(*active->spoils, places);
+    const SpoiltPointers pointers(target, *active->spoils, values);
     const int32_t result = target.real(values);
     ErrorCode code = target.returnsCode ? result : 0;
     for (std::size_t i = 0; i < target.arguments.size(); ++i)
@@ -313,6 +350,11 @@ int32_t Intercepted(const Interceptable &target, Value *values) {
             code = *static_cast<const ErrorCode *>(values[i].pointer);
     active->run.codes.push_back(code);
     return result;
+}
+
+bool Interceptable::hasInOrder(ErrorCode first, ErrorCode later) const {
+    return std::find(std::find(checks.begin(), checks.end(), first), checks.end(), later) !=
+           checks.end();
 }
 
 bool SpoiltRun::hasRaised(ErrorCode code) const {

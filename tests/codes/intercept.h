@@ -16,7 +16,7 @@ namespace qx::test {
 // Calls on their way from a recipe to the module. A recipe makes valid arguments; spoils change
 // some of them, named as in the declaration, before the module sees them.
 
-enum class ArgumentKind { Array1D, Array2D, Array3D, Number, Record, Error, Other };
+enum class ArgumentKind { Array1D, Array2D, Array3D, Number, Record, Word, Error, Other };
 
 struct InterceptedArgument {
     const char *name;
@@ -29,7 +29,9 @@ struct Interceptable {
     const char *name;
     int32_t (*real)(const Value *);
     bool returnsCode;
-    std::vector<ErrorCode> codes; // in the order of the documentation
+    std::vector<ErrorCode> codes;
+    std::vector<ErrorCode> checks; // as the documentation has them: some codes more than once
+    bool hasInOrder(ErrorCode first, ErrorCode later) const;
     std::vector<InterceptedArgument> arguments;
 };
 
@@ -71,6 +73,7 @@ T Typed(void *plain) {
 //     x scale 1e300     x first              0 but for the first element
 //     x up    x down    ascending or descending whole numbers
 //     order = -1        y is x               another value; the same array
+//     slot foreign      ref null             a word that holds no cell of ours; a null pointer
 struct Spoil {
     std::string place, action;
     bool operator==(const Spoil &) const = default;

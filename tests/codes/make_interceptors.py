@@ -7,7 +7,7 @@ import sys
 
 KINDS = {"array1d": "Array1D", "array2d": "Array2D", "array3d": "Array3D", "value": "Number",
          "reference": "Number", "output": "Number", "inout": "Number", "record": "Record",
-         "error": "Error"}
+         "error": "Error", "slot": "Word", "instance": "Word"}
 
 
 def is_whole(argument):
@@ -53,8 +53,9 @@ def row(e, place, codes):
         f'"{a.get("element", "")}"}},\n' for a in e["arguments"])
     real_ = "nullptr" if "*" in e["returns"] else f"Real{place}"
     numbers = ", ".join(str(codes[c]) for c in e["codes"])
+    checks = ", ".join(str(codes[c]) for c in e["checks"])
     return (f'        {{"{e["name"]}", {real_}, {str(e["returns"] == "ErrorCode").lower()},\n'
-            f'         {{{numbers}}},\n         {{\n{parameters}        }}}},\n')
+            f'         {{{numbers}}},\n         {{{checks}}},\n         {{\n{parameters}        }}}},\n')
 
 
 def kind_of(a):

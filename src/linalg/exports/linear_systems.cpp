@@ -11,6 +11,8 @@
 namespace qx {
 namespace {
 
+// kept: of the exports that have an `err`, the last failed check decides
+
 // A lack of rank as the older exports tell it: not at all.
 ErrorCode WithoutRankWarning(ErrorCode status) { return status == WarnRankDeficient ? 0 : status; }
 
