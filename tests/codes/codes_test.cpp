@@ -6,12 +6,9 @@
 #include <set>
 
 // Every code that an export documents is raised by it, and of two faults at once the code that
-// comes first in the documentation. How each is raised is data (witnesses.txt), found by
-// find_codes:
-//
-//     build/release/find_codes build/release/libqxanalysis.so > tests/codes/witnesses.txt
-//
-// with --only EXPORT for one export.
+// comes first in the documentation. How each is raised is data: witnesses.txt, which
+// tools/find_codes writes, and by_hand.txt. A code that only a test of the family raises, or none,
+// has a line in without_witness.txt.
 
 namespace qx::test {
 
@@ -20,15 +17,16 @@ namespace {
 struct WithoutWitness {
     std::string export_;
     ErrorCode code;
+    std::string reason;
 };
 
 std::vector<WithoutWitness> ReadExceptions() {
     std::vector<WithoutWitness> found;
-    for (const std::string &line : LinesOf(QX_NOT_RAISED)) {
+    for (const std::string &line : LinesOf(QX_CODES "without_witness.txt")) {
         const std::vector<std::string> fields = FieldsOf(line);
         if (fields.size() != 3 || fields[2].empty() || AllCodes().count(fields[1]) == 0)
             throw std::invalid_argument("not an export, a code and a reason: " + line);
-        found.push_back({fields[0], AllCodes().at(fields[1])});
+        found.push_back({fields[0], AllCodes().at(fields[1]), fields[2]});
     }
     return found;
 }
@@ -38,7 +36,10 @@ class Codes : public testing::Test {
 protected:
     static void SetUpTestSuite() {
         ASSERT_NE(BindExports(QX_MODULE), nullptr) << QX_MODULE;
-        for (const std::string &line : LinesOf(QX_WITNESSES)) {
+        std::vector<std::string> lines = LinesOf(QX_CODES "witnesses.txt");
+        const std::vector<std::string> byHand = LinesOf(QX_CODES "by_hand.txt");
+        lines.insert(lines.end(), byHand.begin(), byHand.end());
+        for (const std::string &line : lines) {
             const Witness witness = ReadWitness(line);
             const SpoiltRun run = RunSpoilt(*witness.recipe, witness.n, witness.spoils);
             const std::string name = witness.recipe->exportName();
@@ -81,8 +82,27 @@ TEST_F(Codes, AreEachWitnessedOrListedWithAReason) {
                 EXPECT_EQ(witnessed[target.name].count(code) + exceptions[target.name].count(code),
                           1U)
                     << target.name << " | " << NameOf(code)
-                    << ": a witness is needed (find_codes), or a reason in " QX_NOT_RAISED;
+                    << ": a witness is needed (tools/find_codes), or a reason in without_witness.txt";
             }
+    }
+}
+
+// A reason "raised in FILE, TEST" names a test that is there.
+TEST_F(Codes, WithoutWitnessNameTestsThatAreThere) {
+    const std::string head = "raised in ";
+    for (const WithoutWitness &one : ReadExceptions()) {
+        if (!one.reason.starts_with(head))
+            continue;
+        const std::size_t comma = one.reason.find(", ");
+        ASSERT_NE(comma, std::string::npos) << one.reason;
+        const std::string test = one.reason.substr(comma + 2);
+        const std::size_t dot = test.find('.');
+        const std::string words = "(" + test.substr(0, dot) + ", " + test.substr(dot + 1) + ")";
+        bool isThere = false;
+        for (const std::string &line :
+             LinesOf(QX_ROOT "/" + one.reason.substr(head.size(), comma - head.size())))
+            isThere |= line.find(words) != std::string::npos;
+        EXPECT_TRUE(isThere) << one.export_ << ": " << one.reason;
     }
 }
 

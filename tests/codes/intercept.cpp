@@ -186,6 +186,11 @@ bool Apply(const std::string &action, const Located &place, const std::vector<Lo
         return Fill(place, [](int64_t i, double) { return static_cast<double>(i + 1); });
     if (verb == "down")
         return Fill(place, [](int64_t i, double) { return static_cast<double>(-i); });
+    if (verb == "wave")
+        return Fill(place, [](int64_t i, double) {
+            const auto t = static_cast<double>(i);
+            return std::sin(0.37 * t) * (1.0 + 1e-3 * t);
+        });
     if (verb == "at") {
         std::string value;
         words >> value;

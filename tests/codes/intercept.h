@@ -72,6 +72,7 @@ T Typed(void *plain) {
 //     x fill nan        x at 2 -1            numbers; of a complex element both parts
 //     x scale 1e300     x first              0 but for the first element
 //     x up    x down    ascending or descending whole numbers
+//     x wave            a growing sine, of which no value comes twice
 //     order = -1        y is x               another value; the same array
 //     slot foreign      ref null             a word that holds no cell of ours; a null pointer
 struct Spoil {
