@@ -82,7 +82,8 @@ TEST_F(Codes, AreEachWitnessedOrListedWithAReason) {
                 EXPECT_EQ(witnessed[target.name].count(code) + exceptions[target.name].count(code),
                           1U)
                     << target.name << " | " << NameOf(code)
-                    << ": a witness is needed (tools/find_codes), or a reason in without_witness.txt";
+                    << ": a witness is needed (tools/find_codes), or a reason in "
+                       "without_witness.txt";
             }
     }
 }

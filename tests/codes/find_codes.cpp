@@ -103,14 +103,15 @@ std::vector<std::string> ActionsOn(const SpoilPlace &place) {
         if (AllLayouts().count(place.element) != 0 && place.dimensions == 1)
             actions.push_back("size -1");
         for (const char *action :
-             {"fill nan", "fill 0",      "fill 1",       "fill -1",      "fill inf", "at 0 nan",
-              "at 0 inf", "at 0 0",      "at 1 0",       "at 0 -1",      "at 1 -1",  "at 0 1",
-              "at 1 1",   "at 0 100",    "at 1 100",     "at 0 1e300",   "up",       "down",
-              "first",    "scale 1e300", "scale 1e-300", "scale 1e-160", "scale -1", "scale 0",
-              "fill 0.5", "fill 2",      "fill 1e300",   "at 2 0",       "at 2 nan", "at 2 -1",
-              "at 2 100", "scale 1e20",  "at 3 0",       "scale 10",     "fill 3",   "wave",
-              "scale 1e308", "fill 1.7e308", "at 0 1.7e308", "at 1 1.7e308", "at 2 1.7e308",
-              "at 1 nan", "at 3 nan"})
+             {"fill nan",     "fill 0",       "fill 1",       "fill -1",      "fill inf",
+              "at 0 nan",     "at 0 inf",     "at 0 0",       "at 1 0",       "at 0 -1",
+              "at 1 -1",      "at 0 1",       "at 1 1",       "at 0 100",     "at 1 100",
+              "at 0 1e300",   "up",           "down",         "first",        "scale 1e300",
+              "scale 1e-300", "scale 1e-160", "scale -1",     "scale 0",      "fill 0.5",
+              "fill 2",       "fill 1e300",   "at 2 0",       "at 2 nan",     "at 2 -1",
+              "at 2 100",     "scale 1e20",   "at 3 0",       "scale 10",     "fill 3",
+              "wave",         "scale 1e308",  "fill 1.7e308", "at 0 1.7e308", "at 1 1.7e308",
+              "at 2 1.7e308", "at 1 nan",     "at 3 nan"})
             actions.push_back(action);
     }
     return actions;
