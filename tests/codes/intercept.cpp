@@ -295,7 +295,7 @@ public:
                 if (target.arguments[i].name == spoil.place) {
                     if (spoil.action == "null")
                         values[i].pointer = nullptr;
-                    else if (spoil.action == "foreign")
+                    else if (spoil.action == "foreign" && values[i].pointer != nullptr)
                         replace(static_cast<void **>(values[i].pointer));
                 }
     }
