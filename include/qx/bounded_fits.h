@@ -126,15 +126,16 @@ QX_API ErrorCode BoundLogFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w
 
 /** As BoundExpFit_head, for the peak or dip y = a exp(-0.5 ((x - m) / s)^2) + c; s comes back
     without its sign. Bounds of bad length are left out without a word, and so is a guess that does
-    not begin with a finite value. Without a guess the fit starts at the peak on the lowest level
-    of the data or at the dip in the highest. Codes: ErrSizeMismatch (x or w does not fit y),
+    not begin with a finite value. Without a guess the fit starts at the peak on the lowest level of
+    the data or at the dip in the highest. Codes: ErrSizeMismatch (x or w does not fit y),
     ErrNaNInData (a bound is NaN), ErrFitPointsTooFew (fewer samples than free coefficients),
     ErrOutOfMemory (no memory), ErrInvalidSelector (method is above 2), ErrNonFiniteInput (a weight
     is NaN or infinite), ErrTooFewWeights (fewer weights other than 0 than coefficients),
     ErrNoUsableFit (no guess, and neither a peak nor a dip to start from), ErrFitStartValues (s
     starts at 0), ErrNaNInData (the residuals at the start are NaN), ErrNonFiniteInput (the cost is
     NaN or infinite at the start and at the next point), ErrSingularMatrix (a step is not
-    determined), ErrBoundsCrossed (a lower bound is above its upper one), WarnFitIncomplete (guess is too short). */
+    determined), ErrBoundsCrossed (a lower bound is above its upper one), WarnFitIncomplete (guess
+    is too short). */
 QX_API ErrorCode BoundGaussianFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w,
                                        double tolerance, QX_INOUT int32_t *iterations,
                                        QX_IN DBL1D guess, QX_IN DBL1D lower, QX_IN DBL1D upper,

@@ -16,8 +16,9 @@ QX_BEGIN_DECLS
     |w|^((n + count)^2 / 2) in method 1 may leave the range of double; outputs are then infinite or
     NaN with code 0. Method 0 takes n count powers, as many as the two numbers say.
     Codes: ErrEmptyInput (in is empty), ErrInvalidSelector (no such method), ErrOutOfMemory (the
-    host refuses out, or no memory), ErrNonFiniteInput (a, or then w, is not finite),
-    ErrTooFewWeights (|a|^2, or then |w|^2, is 0: a number below about 1e-162 counts as 0). */
+    host refuses out, or no memory), ErrNonFiniteInput (a is not finite), ErrTooFewWeights (|a|^2 is
+    0: a number below about 1e-162 counts as 0), ErrNonFiniteInput (w is not finite),
+    ErrTooFewWeights (|w|^2 is 0). */
 QX_API ErrorCode ChirpZT_head(QX_IN DBL1D in, QX_IN const CDB *a, QX_IN const CDB *w, int32_t count,
                               uint32_t method, QX_OUT CDB1D out);
 /** As ChirpZT_head, for complex data. */
@@ -31,9 +32,9 @@ QX_API ErrorCode CxChirpZT_head(QX_IN CDB1D in, QX_IN const CDB *a, QX_IN const 
     exponentially with n, and powers that leave the range of double make values infinite or NaN with
     code 0.
     Codes: ErrEmptyInput (in is empty), ErrSizesDisagree (count is above n), ErrOutOfMemory (the
-    host refuses out, or no memory), ErrNonFiniteInput (a, or then w, is not finite),
-    ErrTooFewWeights (|a|^2, or then |w|^2, is 0), ErrDegenerateValue (1/a is 0, or two points agree
-    to rounding). */
+    host refuses out), ErrNonFiniteInput (a is not finite), ErrTooFewWeights (|a|^2 is 0),
+    ErrNonFiniteInput (w is not finite), ErrTooFewWeights (|w|^2 is 0), ErrOutOfMemory (no memory),
+    ErrDegenerateValue (1/a is 0, or two points agree to rounding). */
 QX_API ErrorCode InvChirpZT_head(QX_IN CDB1D in, QX_IN const CDB *a, QX_IN const CDB *w,
                                  int32_t count, QX_OUT CDB1D out);
 

@@ -14,7 +14,8 @@
    Three Euler angles turn the system three times, each time about an axis of the system as it has
    been turned so far, in the order of the angles by sequence:
 
-       0 XYX   1 XYZ   2 XZX   3 XZY   4 YXY   5 YXZ   6 YZX   7 YZY   8 ZXY   9 ZXZ   10 ZYX   11 ZYZ
+       0 XYX   1 XYZ   2 XZX   3 XZY   4 YXY   5 YXZ   6 YZX   7 YZY   8 ZXY   9 ZXZ   10 ZYX
+       11 ZYZ
 
    and the direction matrix is R = R3 R2 R1. For example, with angles 1, 2, 3 as indices of c and s,
    under sequence 10 (ZYX: yaw, pitch, roll) R is
@@ -44,11 +45,12 @@ QX_BEGIN_DECLS
 QX_API ErrorCode CoordRotation2D_head(QX_IN DBL1D x, QX_IN DBL1D y, double angle, QX_OUT DBL1D newX,
                                       QX_OUT DBL1D newY);
 
-/** Coordinates of points of space in the system that a direction matrix gives: (newX, newY, newZ)' =
-    R (x, y, z)', with R the rotation nearest to `direction`.
+/** Coordinates of points of space in the system that a direction matrix gives: (newX, newY, newZ)'
+    = R (x, y, z)', with R the rotation nearest to `direction`.
     Codes: ErrSizesDisagree (x, y and z differ in length, or the matrix is not 3 by 3),
-    ErrNonFiniteInput (a coordinate or an element of the matrix), ErrBadCoefficients (no rotation: an
-    element of R'R - 1 beyond 1e-6, or the determinant is -1), ErrOutOfMemory (an array cannot be resized). */
+    ErrNonFiniteInput (a coordinate or an element of the matrix), ErrBadCoefficients (no rotation:
+    an element of R'R - 1 beyond 1e-6, or the determinant is -1), ErrOutOfMemory (an array cannot be
+    resized). */
 QX_API ErrorCode CoordRotationDirection_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D z,
                                              QX_IN DBL2D direction, QX_OUT DBL1D newX,
                                              QX_OUT DBL1D newY, QX_OUT DBL1D newZ);
@@ -58,8 +60,8 @@ QX_API ErrorCode CoordRotationDirection_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN
     ErrNonFiniteInput (a coordinate or an angle), ErrOutOfMemory (an array cannot be resized). */
 QX_API ErrorCode CoordRotationEuler2011_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D z,
                                              double angle1, double angle2, double angle3,
-                                             int32_t sequence, QX_OUT DBL1D newX,
-                                             QX_OUT DBL1D newY, QX_OUT DBL1D newZ);
+                                             int32_t sequence, QX_OUT DBL1D newX, QX_OUT DBL1D newY,
+                                             QX_OUT DBL1D newZ);
 /** As CoordRotationEuler2011_head, with sequence 10 (ZYX). */
 QX_API ErrorCode CoordRotationEuler_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D z, double angle1,
                                          double angle2, double angle3, QX_OUT DBL1D newX,
@@ -67,7 +69,8 @@ QX_API ErrorCode CoordRotationEuler_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL
 
 /** The direction matrix R = R3 R2 R1 of three Euler angles (see above), each element within an ulp
     of 1 of the rotation by exactly these angles.
-    Codes: ErrInvalidSelector (sequence), ErrNonFiniteInput (an angle), ErrOutOfMemory (an array cannot be resized). */
+    Codes: ErrInvalidSelector (sequence), ErrNonFiniteInput (an angle), ErrOutOfMemory (an array
+    cannot be resized). */
 QX_API ErrorCode Euler2Direction2011_head(double angle1, double angle2, double angle3,
                                           int32_t sequence, QX_OUT DBL2D direction);
 /** As Euler2Direction2011_head, with sequence 10 (ZYX). */
@@ -77,8 +80,8 @@ QX_API ErrorCode Euler2Direction_head(double angle1, double angle2, double angle
 /** The Euler angles of a direction matrix. angle1 and angle3 are in -pi to pi, angle2 in -pi/2 to
     pi/2 where the three axes differ, else in 0 to pi. At the lock, where the cosine (three axes) or
     the sine (two) of angle2 is below 4 eps and only the sum or difference of the others has a
-    meaning, angle3 is 0. Near it angle1 has few digits and angle3 makes up for it: the matrix made of
-    the angles is within 4 eps of the rotation nearest to `direction`, at the lock within 12 eps.
+    meaning, angle3 is 0. Near it angle1 has few digits and angle3 makes up for it: the matrix made
+    of the angles is within 4 eps of the rotation nearest to `direction`, at the lock within 12 eps.
     Codes: ErrSizesDisagree (the matrix is not 3 by 3), ErrInvalidSelector (sequence),
     ErrNonFiniteInput (an element), ErrBadCoefficients (no rotation: an element of R'R - 1 beyond
     1e-6, or the determinant is -1). */
@@ -86,12 +89,13 @@ QX_API ErrorCode Direction2Euler2011_head(QX_IN DBL2D direction, int32_t sequenc
                                           QX_OUT double *angle1, QX_OUT double *angle2,
                                           QX_OUT double *angle3);
 
-/** Converts points between kinds of coordinates. from, to: 0 Cartesian (x, y, z); 1 spherical (radius,
-    azimuth, inclination from the positive z axis); 2 cylindrical (radius, azimuth, height). Spherical to Cartesian: x = radius sin(inclination) cos(azimuth), y = radius
+/** Converts points between kinds of coordinates. from, to: 0 Cartesian (x, y, z); 1 spherical
+    (radius, azimuth, inclination from the positive z axis); 2 cylindrical (radius, azimuth,
+    height). Spherical to Cartesian: x = radius sin(inclination) cos(azimuth), y = radius
     sin(inclination) sin(azimuth), z = radius cos(inclination). Results have radii of at least 0,
     azimuths above -pi and at most pi, inclinations in 0 to pi; azimuth and inclination are 0 where
-    they have no meaning. Inputs need not keep to these ranges. Where `from` and `to` are the same the
-    arrays are copied as they are. Values beyond the range of a double become infinite.
+    they have no meaning. Inputs need not keep to these ranges. Where `from` and `to` are the same
+    the arrays are copied as they are. Values beyond the range of a double become infinite.
     Codes: ErrSizesDisagree (the arrays differ in length), ErrInvalidSelector (from, to),
     ErrNonFiniteInput (a coordinate), ErrOutOfMemory (an array cannot be resized). */
 QX_API ErrorCode CoordConversion_head(int32_t from, int32_t to, QX_IN DBL1D first,

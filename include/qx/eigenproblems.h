@@ -18,7 +18,7 @@ QX_BEGIN_DECLS
    The values are those of a matrix that differs from the balanced a by a few n eps of its norm.
    Matrices that are graded over the whole range of the numbers can pass the limit of the iteration:
    random elements that halve from row to row and from column to column do from order 110 on. Codes:
-   ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrOutOfMemory (no memory),
+   ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory),
     ErrInvalidSelector (*output is not 0 or 1), ErrNonFiniteInput (an element is not finite),
     ErrIterationLimit (40 iterations were not enough for a value). */
 QX_API int32_t EigenValueVector_head(QX_IN DBL2D a, QX_IN const int32_t *output,
@@ -28,7 +28,7 @@ QX_API int32_t EigenValueVector_head(QX_IN DBL2D a, QX_IN const int32_t *output,
 /** As EigenValueVector_head, for complex elements. matrixType: 0 a general matrix, of which
     pairs mean nothing; 1 a Hermitian one, read from its lower triangle, whose values ascend and are
     real, and whose vectors are orthonormal.
-    Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrOutOfMemory (no memory),
+    Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory),
     ErrInvalidSelector (*matrixType or *output is not 0 or 1), ErrNonFiniteInput (an element is not
     finite), ErrIterationLimit (40 iterations were not enough for a value, or 100 if Hermitian). */
 QX_API int32_t CxEigenValueVector_head(QX_IN CDB2D a, QX_IN const int32_t *matrixType,
@@ -38,7 +38,7 @@ QX_API int32_t CxEigenValueVector_head(QX_IN CDB2D a, QX_IN const int32_t *matri
 /** Eigenvalues, ascending, of the symmetric matrix whose lower triangle a holds. output: 0 a stays;
    1 a becomes the matrix of orthonormal eigenvectors, one in each column. Householder reduction and
    implicit QL iteration. The error of a value is a few n eps times the largest one. Codes:
-   ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrOutOfMemory (no memory),
+   ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory),
     ErrInvalidSelector (*output is not 0 or 1), ErrNonFiniteInput (an element is not finite),
     ErrIterationLimit (100 iterations were not enough for a value). */
 QX_API int32_t SymEvectorEvalue_head(QX_INOUT DBL2D a, QX_IN const int32_t *output,

@@ -23,18 +23,17 @@ QX_BEGIN_DECLS
 QX_API ErrorCode QZ80_head(QX_INOUT DBL2D a, QX_INOUT DBL2D b, int32_t wantVectors, int32_t order,
                            QX_OUT DBL2D q, QX_OUT DBL2D z, QX_OUT CDB1D alpha, QX_OUT DBL1D beta);
 /** As QZ80_head, for complex elements: a = q s z^H and b = q t z^H with triangular s and t. */
-QX_API ErrorCode CxQZ80_head(QX_INOUT CDB2D a, QX_INOUT CDB2D b, int32_t wantVectors,
-                             int32_t order, QX_OUT CDB2D q, QX_OUT CDB2D z, QX_OUT CDB1D alpha,
-                             QX_OUT CDB1D beta);
+QX_API ErrorCode CxQZ80_head(QX_INOUT CDB2D a, QX_INOUT CDB2D b, int32_t wantVectors, int32_t order,
+                             QX_OUT CDB2D q, QX_OUT CDB2D z, QX_OUT CDB1D alpha, QX_OUT CDB1D beta);
 /** As QZ80_head, with the eigenvalues as they come. */
 QX_API ErrorCode QZ_head(QX_INOUT DBL2D a, QX_INOUT DBL2D b, int32_t wantVectors, QX_OUT DBL2D q,
                          QX_OUT DBL2D z, QX_OUT CDB1D alpha, QX_OUT DBL1D beta);
 /** As QZ_head, for complex elements: a = q s z^H and b = q t z^H with triangular s and t. */
-QX_API ErrorCode CxQZ_head(QX_INOUT CDB2D a, QX_INOUT CDB2D b, int32_t wantVectors,
-                           QX_OUT CDB2D q, QX_OUT CDB2D z, QX_OUT CDB1D alpha, QX_OUT CDB1D beta);
+QX_API ErrorCode CxQZ_head(QX_INOUT CDB2D a, QX_INOUT CDB2D b, int32_t wantVectors, QX_OUT CDB2D q,
+                           QX_OUT CDB2D z, QX_OUT CDB1D alpha, QX_OUT CDB1D beta);
 
-/** As QZ80_head, always with vectors, and in the columns of `vectors` the right eigenvectors of unit
-    length, beta a v = alpha b v. */
+/** As QZ80_head, always with vectors, and in the columns of `vectors` the right eigenvectors of
+    unit length, beta a v = alpha b v. */
 QX_API ErrorCode TmiQZ_head(QX_INOUT DBL2D a, QX_INOUT DBL2D b, int32_t order, QX_OUT DBL2D q,
                             QX_OUT DBL2D z, QX_OUT CDB1D alpha, QX_OUT DBL1D beta,
                             QX_OUT CDB2D vectors);
@@ -51,8 +50,8 @@ QX_API ErrorCode CxTmiQZ_head(QX_INOUT CDB2D a, QX_INOUT CDB2D b, int32_t order,
     ErrNonFiniteInput (an element is not finite), ErrIterationLimit (the iteration did not
    converge), ErrConditionTooHigh (it failed for another reason), ErrSolverCount (rounding changed
    the eigenvalues). */
-QX_API ErrorCode GenEigenEx_head(QX_IN DBL2D a, QX_IN DBL2D b, int32_t output,
-                                 QX_OUT CDB1D values, QX_OUT CDB2D vectors);
+QX_API ErrorCode GenEigenEx_head(QX_IN DBL2D a, QX_IN DBL2D b, int32_t output, QX_OUT CDB1D values,
+                                 QX_OUT CDB2D vectors);
 /** As GenEigenEx_head, for complex elements. */
 QX_API ErrorCode CxGenEigenEx_head(QX_IN CDB2D a, QX_IN CDB2D b, int32_t output,
                                    QX_OUT CDB1D values, QX_OUT CDB2D vectors);
@@ -60,8 +59,8 @@ QX_API ErrorCode CxGenEigenEx_head(QX_IN CDB2D a, QX_IN CDB2D b, int32_t output,
 /** Generalised singular values of a (m by n) and b (p by n): u^T a q = d1 (0 r) and v^T b q = d2 (0
     r) with orthogonal u (m by m), v (p by p) and q (n by n). r is triangular of order *k + *l, the
     rank of a and b together; *l is the rank of b. The first *k + *l elements of alpha and beta have
-    alpha^2 + beta^2 = 1. d1 has alpha on its diagonal; d2 has beta[*k], beta[*k + 1] ... there. a and
-    b become the results of LAPACK's xGGSVD3, whose documentation tells where r stands.
+    alpha^2 + beta^2 = 1. d1 has alpha on its diagonal; d2 has beta[*k], beta[*k + 1] ... there. a
+    and b become the results of LAPACK's xGGSVD3, whose documentation tells where r stands.
     Codes: ErrEmptyInput (a or b is empty), ErrBandVectorSize (b has another number of columns than
     a), ErrOutOfMemory (no memory), ErrNonFiniteInput (an element is not finite), ErrIterationLimit
     (the iteration did not converge). */

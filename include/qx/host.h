@@ -39,8 +39,7 @@ QX_HOST_API void *QXHostNew1D(int32_t typeCode, int32_t count);
 QX_HOST_API void *QXHostNew2D(int32_t typeCode, int32_t rows, int32_t cols);
 /* The same with the elements copied from memory of the caller's. */
 QX_HOST_API void *QXHostCopy1D(int32_t typeCode, int32_t count, const void *elements);
-QX_HOST_API void *QXHostCopy2D(int32_t typeCode, int32_t rows, int32_t cols,
-                                       const void *elements);
+QX_HOST_API void *QXHostCopy2D(int32_t typeCode, int32_t rows, int32_t cols, const void *elements);
 /* In three dimensions, for inputs; such an array cannot be resized. */
 QX_HOST_API void *QXHostCopy3D(int32_t typeCode, int32_t first, int32_t second, int32_t third,
                                const void *elements);

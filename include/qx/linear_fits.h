@@ -38,8 +38,8 @@ QX_API int32_t LinFitCoef80_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, QX
 
 /** The polynomial sum of coefficients[j] x^j, j = 0 to `order`, and its values. In raw powers of x:
     for a high order bring x to the size of 1 beforehand, since powers beyond the range fail and
-    those below it make coefficients infinite. algorithm: as GenLSFit80_head. At most 26 coefficients
-    are fitted; those of orders above 25 are 0, with a warning.
+    those below it make coefficients infinite. algorithm: as GenLSFit80_head. At most 26
+    coefficients are fitted; those of orders above 25 are 0, with a warning.
     Codes: ErrSizeMismatch (the arrays differ in length), ErrPolynomialOrderNegative (order is
     negative), ErrPolynomialOrderTooHigh (not more samples than `order`), ErrOutOfMemory (no memory,
     or the host refused a resize), ErrInvalidSelector (no such algorithm), ErrNonFiniteInput (a

@@ -43,7 +43,7 @@ QX_API int32_t CxLULinEqs_head(QX_IN CDB2D lu, QX_IN I32_1D pivots, QX_INOUT CDB
                                QX_OUT ErrorCode *err);
 
 /** Inverse by LU factorisation, in place of a.
-    Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrOutOfMemory (no memory),
+    Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory),
     ErrSingularMatrix (a column has no pivot but 0). */
 QX_API int32_t InvMatrixLUDri_head(QX_INOUT DBL2D a, QX_OUT ErrorCode *err);
 /** As InvMatrixLUDri_head, for complex data. */
@@ -166,8 +166,9 @@ QX_API ErrorCode CxTriEqsSetDri_head(QX_IN CDB2D a, int32_t triangle, QX_IN CDB2
                                      QX_OUT CDB2D x);
 
 /** As TriEqsSetDri_head, for a packed triangle and in place of b, with the code in *err.
-    Codes: ErrInvalidSelector (triangle is neither 0 nor 1), ErrNotSquare (a is empty, or its
-    length is no n (n+1) / 2), ErrSizeMismatch (b has not n elements), ErrNonFiniteInput (a or b holds NaN or infinity), ErrSingularMatrix (as there). */
+    Codes: ErrInvalidSelector (triangle is neither 0 nor 1), ErrNotSquare (a is empty, or its length
+    is no n (n+1) / 2), ErrSizeMismatch (b has not n elements), ErrNonFiniteInput (a or b holds NaN
+    or infinity), ErrSingularMatrix (as there). */
 QX_API int32_t TriLinEqs_head(QX_IN const PackedTriangle *a, QX_INOUT DBL1D b,
                               QX_OUT ErrorCode *err);
 /** As TriLinEqs_head, for complex data. */
@@ -177,9 +178,9 @@ QX_API int32_t CxTriLinEqs_head(QX_IN const CxPackedTriangle *a, QX_INOUT CDB1D 
 /** Solves a band system in place of b. Row upperBands + i - j, column j of `band` holds a(i, j), so
     row 0 is the topmost diagonal. Through LAPACK; the last bits depend on the processor.
     Codes: ErrSizesDisagree (band has not lowerBands + upperBands + 1 rows), ErrBandVectorSize (b
-    has not as many elements as band has columns), ErrEmptyInput (band has no column),
-    ErrSizesDisagree (a count of bands is below 0, or lowerBands + upperBands + 1 is above the
-    order), ErrOutOfMemory (no memory), ErrSingularMatrix (a pivot is 0). */
+    has not as many elements as band has columns), ErrEmptyInput (band, or a matrix b, has no
+    column), ErrSizesDisagree (a count of bands is below 0, or lowerBands + upperBands + 1 is above
+    the order), ErrOutOfMemory (no memory), ErrSingularMatrix (a pivot is 0). */
 QX_API ErrorCode BandEqsDriH(QX_IN DBL2D band, QX_INOUT DBL1D b, int32_t lowerBands,
                              int32_t upperBands);
 /** As BandEqsDriH, for complex data. */

@@ -34,7 +34,7 @@ QX_API int32_t CxCholesky_head(QX_INOUT CDB1D packed, QX_OUT ErrorCode *err);
 
 /** The factor of Cholesky_head in place of a square matrix: read from the lower triangle, and
     written there with zeros above.
-    Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrOutOfMemory (no memory),
+    Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory),
     ErrNotPositiveDefinite (a is not positive definite, or nearly singular). */
 QX_API int32_t FullCholesky_head(QX_INOUT DBL2D a, QX_OUT ErrorCode *err);
 /** As FullCholesky_head, for a Hermitian matrix. */
@@ -49,14 +49,14 @@ QX_API int32_t CxCholesky_InvMatrix_head(QX_INOUT CDB1D packedFactor, QX_OUT Err
 
 /** The inverse of a symmetric positive definite matrix in its place. Only the lower triangle is
     read; both are written.
-    Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrOutOfMemory (no memory),
+    Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory),
     ErrNotPositiveDefinite (a is not positive definite, or nearly singular). */
 QX_API int32_t InvMatrixChoDri_head(QX_INOUT DBL2D a, QX_OUT ErrorCode *err);
 /** As InvMatrixChoDri_head, for a Hermitian matrix. */
 QX_API int32_t CxInvMatrixChoDri_head(QX_INOUT CDB2D a, QX_OUT ErrorCode *err);
 
-/** As InvMatrixChoDri_head, without a request for memory: packedWork, of at least n(n+1)/2 elements,
-    is the work space. It is neither resized nor emptied.
+/** As InvMatrixChoDri_head, without a request for memory: packedWork, of at least n(n+1)/2
+    elements, is the work space. It is neither resized nor emptied.
     Codes: ErrSizeMismatch (packedWork is too short), ErrNotSquare (a is not square), ErrEmptyInput
     (a is empty), ErrNotPositiveDefinite (a is not positive definite, or nearly singular). */
 QX_API int32_t PreallocInvMatrixChoDri_H(QX_INOUT DBL2D a, QX_INOUT DBL1D packedWork,
@@ -74,8 +74,8 @@ typedef struct CxPackedTriangle {
 } CxPackedTriangle;
 
 /** The inverse of a packed triangle, in its place.
-    Codes: ErrInvalidSelector (triangle is not 0 or 1), ErrEmptyInput (packed is empty), ErrNotSquare
-    (the length is no n(n+1)/2), ErrNonFiniteInput (an element is not finite),
+    Codes: ErrInvalidSelector (triangle is not 0 or 1), ErrEmptyInput (packed is empty),
+    ErrNotSquare (the length is no n(n+1)/2), ErrNonFiniteInput (an element is not finite),
     ErrSingularMatrix (a diagonal element is at most 2.2e-16 of the largest element in absolute
     value). */
 QX_API int32_t Tri_InvMatrix_head(QX_INOUT PackedTriangle *a, QX_OUT ErrorCode *err);
@@ -121,16 +121,17 @@ QX_API ErrorCode QRDecH(QX_IN DBL2D a, int32_t pivoting, int32_t economy, QX_OUT
 QX_API ErrorCode CxQRDecH(QX_IN CDB2D a, int32_t pivoting, int32_t economy,
                           QX_OUT I32_2D permutation, QX_OUT CDB2D q, QX_OUT CDB2D r);
 
-/** Singular value decomposition a = u diag(s) v^T of the m by n matrix a, k = min(m, n): a becomes u
-    of m by k, s has k falling values, and v is n by k. G. H. Golub and C. Reinsch, "Singular value
-    decomposition and least squares solutions", 1970. For norms from 1 on, u diag(s) v^T is off by a
-    few n eps times the norm. What is below 2.2e-16 counts as zero whatever the norm, so below 1 it is
-    off by up to 2.2e-16: relative to the norm 2e-10 at a norm of 1e-6, 2e-4 at 1e-12, and no digit is
-    right below 1e-15 (measured). Values lose digits later, relative to the largest one 1e-14 at 1e-8,
-    1e-6 at 1e-12 and 1e-2 at 1e-14. A matrix of a norm below 1 should be scaled up first, and so for
-    every export that stands on this decomposition. A value that overflows is infinite.
-    Codes: ErrEmptyInput (a is empty), ErrOutOfMemory (no memory), ErrNonFiniteInput (an element is not
-    finite), ErrIterationLimit (100 iterations were not enough for a value). */
+/** Singular value decomposition a = u diag(s) v^T of the m by n matrix a, k = min(m, n): a becomes
+    u of m by k, s has k falling values, and v is n by k. G. H. Golub and C. Reinsch, "Singular
+    value decomposition and least squares solutions", 1970. For norms from 1 on, u diag(s) v^T is
+    off by a few n eps times the norm. What is below 2.2e-16 counts as zero whatever the norm, so
+    below 1 it is off by up to 2.2e-16: relative to the norm 2e-10 at a norm of 1e-6, 2e-4 at 1e-12,
+    and no digit is right below 1e-15 (measured). Values lose digits later, relative to the largest
+    one 1e-14 at 1e-8, 1e-6 at 1e-12 and 1e-2 at 1e-14. A matrix of a norm below 1 should be scaled
+    up first, and so for every export that stands on this decomposition. A value that overflows is
+    infinite.
+    Codes: ErrEmptyInput (a is empty), ErrOutOfMemory (no memory), ErrNonFiniteInput (an element is
+    not finite), ErrIterationLimit (100 iterations were not enough for a value). */
 QX_API int32_t SVD_head(QX_INOUT DBL2D a, QX_OUT DBL1D s, QX_OUT DBL2D v, QX_OUT ErrorCode *err);
 /** As SVD_head, for complex elements: a = u diag(s) v^H. */
 QX_API int32_t CxSVD_head(QX_INOUT CDB2D a, QX_OUT DBL1D s, QX_OUT CDB2D v, QX_OUT ErrorCode *err);
@@ -148,11 +149,11 @@ QX_API int32_t SVDS_head(QX_IN DBL2D a, QX_OUT DBL1D s, QX_OUT ErrorCode *err);
 /** As SVDS_head, for complex elements. */
 QX_API int32_t CxSVDS_head(QX_IN CDB2D a, QX_OUT DBL1D s, QX_OUT ErrorCode *err);
 
-/** Hessenberg form h = q^T a q of the square matrix a, in its place, by Householder reflections: zero
-    below the first subdiagonal. Rows and columns low to high, counted from 1 as MatrixBalance_head
-    gives them, are reduced; a must be upper triangular outside of them.
-    Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrIndexOutOfRange (not 1 <= low
-    <= high <= n), ErrOutOfMemory (no memory), ErrNonFiniteInput (an element is not finite). */
+/** Hessenberg form h = q^T a q of the square matrix a, in its place, by Householder reflections:
+    zero below the first subdiagonal. Rows and columns low to high, counted from 1 as
+    MatrixBalance_head gives them, are reduced; a must be upper triangular outside of them.
+    Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrIndexOutOfRange (not 1 <=
+    low <= high <= n), ErrOutOfMemory (no memory), ErrNonFiniteInput (an element is not finite). */
 QX_API ErrorCode Hessenberg_head(QX_INOUT DBL2D a, int32_t low, int32_t high, QX_OUT DBL2D q);
 /** As Hessenberg_head, for complex elements: h = q^H a q. */
 QX_API ErrorCode CxHessenberg_head(QX_INOUT CDB2D a, int32_t low, int32_t high, QX_OUT CDB2D q);

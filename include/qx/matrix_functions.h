@@ -11,54 +11,55 @@
 
 QX_BEGIN_DECLS
 
-/** exp(a) in place of the square matrix a, by scaling, a Pade approximant and repeated squaring; of a
-    diagonal matrix element by element. The degree of the approximant follows from the bound 1e-8 /
-    (exp(norm) norm) on its error, where norm is the largest row sum of absolute values. Relative to
-    the largest element of the result the errors measured (random matrices of several kinds, orders 2
-    to 5) are rounding errors up to a norm of 0.1, up to 4e-8 next below 1, where rotations are worst,
-    6e-9 up to 2, 4e-10 up to 8, and above that those of the squaring, which grow with the norm: 4e-14
-    at 100, 3e-13 at 500, and more where powers of a are far larger than exp(a). Elements that
-    overflow, and what is computed from them, are infinite or NaN. C. Moler and C. Van Loan, "Nineteen
-    dubious ways to compute the exponential of a matrix", 1978.
-    Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrOutOfMemory (no memory),
+/** exp(a) in place of the square matrix a, by scaling, a Pade approximant and repeated squaring; of
+    a diagonal matrix element by element. The degree of the approximant follows from the bound 1e-8
+    / (exp(norm) norm) on its error, where norm is the largest row sum of absolute values. Relative
+    to the largest element of the result the errors measured (random matrices of several kinds,
+    orders 2 to 5) are rounding errors up to a norm of 0.1, up to 4e-8 next below 1, where rotations
+    are worst, 6e-9 up to 2, 4e-10 up to 8, and above that those of the squaring, which grow with
+    the norm: 4e-14 at 100, 3e-13 at 500, and more where powers of a are far larger than exp(a).
+    Elements that overflow, and what is computed from them, are infinite or NaN. C. Moler and C. Van
+    Loan, "Nineteen dubious ways to compute the exponential of a matrix", 1978.
+    Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory),
     ErrNonFiniteInput (an element, or the norm, is not finite, unless a is diagonal). */
 QX_API int32_t MatrixExp_head(QX_INOUT DBL2D a, QX_OUT ErrorCode *err);
 /** As MatrixExp_head, for complex elements. */
 QX_API int32_t CxMatrixExp_head(QX_INOUT CDB2D a, QX_OUT ErrorCode *err);
 
 /** The principal logarithm of the square matrix a. It is that of the eigenvalues, if the condition
-    number of the eigenvectors is up to 1e14, refined until its exponential gives a back to a relative
-    1e-12; otherwise, and for a singular a, 2^k times ten terms of the series after k square roots. A
-    diagonal matrix is taken element by element. The exponential is that of MatrixExp_head, whose own
-    error limits what refinement can tell: the error can reach 4e-8, while exp(log(a)) gives a back.
-    log |z| is half the logarithm of |z|^2, so an element of a diagonal matrix, or an eigenvalue, above
-    1e154 in modulus has an infinite one, and one below 1e-162 counts as zero.
-    Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrOutOfMemory (no memory),
+    number of the eigenvectors is up to 1e14, refined until its exponential gives a back to a
+    relative 1e-12; otherwise, and for a singular a, 2^k times ten terms of the series after k
+    square roots. A diagonal matrix is taken element by element. The exponential is that of
+    MatrixExp_head, whose own error limits what refinement can tell: the error can reach 4e-8, while
+    exp(log(a)) gives a back. log |z| is half the logarithm of |z|^2, so an element of a diagonal
+    matrix, or an eigenvalue, above 1e154 in modulus has an infinite one, and one below 1e-162
+    counts as zero.
+    Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory),
     ErrNonFiniteInput (an element, or the result, is not finite), ErrDegenerateValue (a has a zero
-    eigenvalue, or square roots did not come near the identity), ErrSingularMatrix (an exponential has
-    no inverse), ErrConditionTooHigh (the eigenvectors of a, slightly changed, are dependent),
-    ErrIterationLimit (the eigenvalue iteration did not converge), WarnSingular (a is singular, and the
-    series gave a result all the same), WarnLowAccuracy (the best that was found is off by more than
-    1e-12). */
+    eigenvalue, or square roots did not come near the identity), ErrSingularMatrix (an exponential
+    has no inverse), ErrConditionTooHigh (the eigenvectors of a, slightly changed, are dependent),
+    ErrIterationLimit (the eigenvalue iteration did not converge), WarnSingular (a is singular, and
+    the series gave a result all the same), WarnLowAccuracy (the best that was found is off by more
+    than 1e-12). */
 QX_API int32_t MatrixLn_head(QX_IN DBL2D a, QX_OUT CDB2D out, QX_OUT ErrorCode *err);
 /** As MatrixLn_head, for complex elements and in place. */
 QX_API int32_t CxMatrixLn_head(QX_INOUT CDB2D a, QX_OUT ErrorCode *err);
 
-/** The real part of the principal square root in place of the square matrix a; imaginary parts, which
-    negative eigenvalues give, are dropped without a sign. Through the complex Schur form with
-    eigenvalues of falling modulus: A. Bjorck and S. Hammarling, "A Schur method for the square root of
-    a matrix", 1983. A singular matrix may have no root, as 0 1, 0 0 has none: elements are then NaN,
-    infinite or of no meaning, and the warning is the only sign of it.
-    Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrOutOfMemory (no memory),
-    ErrNonFiniteInput (an element, or an eigenvalue, is not finite), ErrIterationLimit (the eigenvalue
-    iteration did not converge), ErrConditionTooHigh (the eigenvalues could not be ordered),
-    WarnLowAccuracy (two or more eigenvalues are below 1e-12: there may be no root). */
+/** The real part of the principal square root in place of the square matrix a; imaginary parts,
+    which negative eigenvalues give, are dropped without a sign. Through the complex Schur form with
+    eigenvalues of falling modulus: A. Bjorck and S. Hammarling, "A Schur method for the square root
+    of a matrix", 1983. A singular matrix may have no root, as 0 1, 0 0 has none: elements are then
+    NaN, infinite or of no meaning, and the warning is the only sign of it.
+    Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory),
+    ErrNonFiniteInput (an element, or an eigenvalue, is not finite), ErrIterationLimit (the
+    eigenvalue iteration did not converge), ErrConditionTooHigh (the eigenvalues could not be
+    ordered), WarnLowAccuracy (two or more eigenvalues are below 1e-12: there may be no root). */
 QX_API int32_t MatrixSqrt_head(QX_INOUT DBL2D a, QX_OUT ErrorCode *err);
 /** As MatrixSqrt_head, with the whole complex root in `out`; the code is the function result.
     Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory),
-    ErrNonFiniteInput (an element, or an eigenvalue, is not finite), ErrIterationLimit (the eigenvalue
-    iteration did not converge), ErrConditionTooHigh (the eigenvalues could not be ordered),
-    WarnLowAccuracy (two or more eigenvalues are below 1e-12: there may be no root). */
+    ErrNonFiniteInput (an element, or an eigenvalue, is not finite), ErrIterationLimit (the
+    eigenvalue iteration did not converge), ErrConditionTooHigh (the eigenvalues could not be
+    ordered), WarnLowAccuracy (two or more eigenvalues are below 1e-12: there may be no root). */
 QX_API ErrorCode MatrixSqrtH(QX_IN DBL2D a, QX_OUT CDB2D out);
 /** As MatrixSqrt_head, for complex elements; nothing is dropped. */
 QX_API int32_t CxMatrixSqrt_head(QX_INOUT CDB2D a, QX_OUT ErrorCode *err);
@@ -74,14 +75,15 @@ QX_API ErrorCode MatrixPower_head(QX_INOUT DBL2D a, int32_t power);
 /** As MatrixPower_head, for complex elements. */
 QX_API ErrorCode CxMatrixPower_head(QX_INOUT CDB2D a, int32_t power);
 
-/** The pseudo-inverse (E. H. Moore, R. Penrose) in place of the m by n matrix a, n by m: v diag(1/s)
-    u^T of its singular value decomposition. Values not above *tolerance, an absolute number, count as
-    0; a negative one stands for max(m, n) s[0] 2.2e-16. Where the norm of a is below 1, digits are
-    lost (SVD_head): the relative error is up to about 2.2e-16 times the condition number divided by
-    the norm, for a condition number of 1000 measured 2e-9 at a norm of 1e-4, 2e-5 at 1e-8 and 0.2 at
-    1e-12; scale a up. Where 1/s overflows, elements are infinite or NaN.
-    Codes: ErrEmptyInput (a is empty), ErrOutOfMemory (no memory), ErrNonFiniteInput (an element is not
-    finite), ErrIterationLimit (the singular value iteration did not converge). */
+/** The pseudo-inverse (E. H. Moore, R. Penrose) in place of the m by n matrix a, n by m: v
+    diag(1/s) u^T of its singular value decomposition. Values not above *tolerance, an absolute
+    number, count as 0; a negative one stands for max(m, n) s[0] 2.2e-16. Where the norm of a is
+    below 1, digits are lost (SVD_head): the relative error is up to about 2.2e-16 times the
+    condition number divided by the norm, for a condition number of 1000 measured 2e-9 at a norm of
+    1e-4, 2e-5 at 1e-8 and 0.2 at 1e-12; scale a up. Where 1/s overflows, elements are infinite or
+    NaN.
+    Codes: ErrEmptyInput (a is empty), ErrOutOfMemory (no memory), ErrNonFiniteInput (an element is
+    not finite), ErrIterationLimit (the singular value iteration did not converge). */
 QX_API int32_t PseudoInverse_head(QX_INOUT DBL2D a, QX_IN const double *tolerance,
                                   QX_OUT ErrorCode *err);
 /** As PseudoInverse_head, for complex elements. */

@@ -12,9 +12,10 @@ QX_BEGIN_DECLS
 
 /** Determinant of a square matrix. matrixType: 0 general (LU); 1 positive definite (Cholesky, of
     which the lower triangle is read); 2 lower triangular; 3 upper triangular (the product of the
-    diagonal). One of order 2 is computed by the formula whatever the type. It is 0 for a matrix that
-    is singular or, of type 1, not positive definite. Products that overflow make it infinite or NaN.
-    Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrInvalidSelector
+    diagonal). One of order 2 is computed by the formula whatever the type. It is 0 for a matrix
+    that is singular or, of type 1, not positive definite. Products that overflow make it infinite
+    or NaN.
+    Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrInvalidSelector
     (*matrixType is not 0 to 3), ErrNonFiniteInput (a holds NaN or infinity), ErrOutOfMemory (no
     memory). */
 QX_API int32_t Determinant_head(QX_IN DBL2D a, QX_IN const int32_t *matrixType, QX_OUT DBL *det,
@@ -65,7 +66,7 @@ QX_API int32_t CxNorm_head(QX_IN CDB2D a, QX_IN const int32_t *normType, QX_OUT 
                            QX_OUT ErrorCode *err);
 
 /** Sum of the diagonal of a square matrix.
-    Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square). */
+    Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty). */
 QX_API int32_t Trace_head(QX_IN DBL2D a, QX_OUT DBL *trace, QX_OUT ErrorCode *err);
 /** As Trace_head, for complex data. */
 QX_API int32_t CxTrace_head(QX_IN CDB2D a, QX_OUT CDB *trace, QX_OUT ErrorCode *err);
@@ -114,9 +115,9 @@ QX_API ErrorCode CxCheckSym_head(QX_IN CDB2D a, double tolerance, int32_t relati
 
 /** Whether a is positive definite: exactly symmetric, with all eigenvalues above 2.2e-16 times the
     largest modulus of them.
-    Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrNonFiniteInput (a is
-    symmetric and holds infinity), ErrOutOfMemory (no memory), ErrIterationLimit (the eigenvalues
-    do not converge). */
+    Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrNonFiniteInput (a is
+    symmetric and holds infinity), ErrOutOfMemory (no memory), ErrIterationLimit (the eigenvalues do
+    not converge). */
 QX_API int32_t CheckPosdef_head(QX_IN DBL2D a, QX_OUT int32_t *isPositiveDefinite,
                                 QX_OUT ErrorCode *err);
 /** As CheckPosdef_head, for complex data: exactly Hermitian. */
@@ -138,7 +139,7 @@ QX_API ErrorCode CxCheckPosSemiDef_head(QX_IN CDB2D a, double tolerance,
 
 /** Coefficients of det(t - a), ascending: poly has one element more than a has rows, the last one
     is 1. They are multiplied up from the eigenvalues.
-    Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrOutOfMemory (no memory, or
+    Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory, or
     the host refused the resize), ErrNonFiniteInput (a holds NaN or infinity), ErrIterationLimit
     (the eigenvalues do not converge), ErrOverflow (a coefficient overflows). */
 QX_API int32_t MatrixCharacteristicPoly_head(QX_IN DBL2D a, QX_OUT DBL1D poly,

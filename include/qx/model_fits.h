@@ -26,9 +26,10 @@ QX_BEGIN_DECLS
     that a or b is infinite or 0 and the values are infinite or NaN, with the code 0. b overflows,
     too, where the x lie within some 1e-306.
     Codes: ErrSizeMismatch (the arrays differ in length), ErrFewerThanTwo (less than two samples),
-    ErrNonFiniteInput (a weight is NaN, or a sample not finite), ErrTooFewWeights (all weights but
-    one are 0), ErrPolynomialOrderTooHigh (less than two values have the sign of most),
-    ErrOutOfMemory (no memory), ErrIterationLimit (singular values do not converge). */
+    ErrNonFiniteInput (a weight is NaN), ErrTooFewWeights (all weights but one are 0),
+    ErrPolynomialOrderTooHigh (less than two values have the sign of most), ErrNonFiniteInput (a
+    sample is not finite), ErrOutOfMemory (no memory), ErrIterationLimit (singular values do not
+    converge). */
 QX_API ErrorCode ExpFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D deviations,
                              QX_OUT double *a, QX_OUT double *b, QX_OUT double *mse);
 /** y = a exp(b x), with weights as they are. Method 0 is that of ExpFit_head, which leaves
@@ -38,8 +39,9 @@ QX_API ErrorCode ExpFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D deviat
     Codes: ErrSizeMismatch (the arrays differ in length), ErrFewerThanTwo (less than two samples),
     ErrNonFiniteInput (a weight is NaN), ErrTooFewWeights (all weights but one are 0),
     ErrPolynomialOrderTooHigh (less than two values have the sign of most), ErrNonFiniteInput (a
-    sample or a step's exponential is not finite), ErrOutOfMemory (no memory), ErrIterationLimit (singular values do not
-    converge), WarnFitIncomplete (the guess has neither no values nor two). */
+    sample or a step's exponential is not finite), ErrOutOfMemory (no memory), ErrIterationLimit
+    (singular values do not converge), WarnFitIncomplete (the guess has neither no values nor
+    two). */
 QX_API ErrorCode ExpFit80_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, double tolerance,
                                QX_IN DBL1D guess, uint16_t method, QX_OUT double *a,
                                QX_OUT double *b, QX_OUT double *mse, QX_INOUT int32_t *iterations,
@@ -63,9 +65,9 @@ QX_API ErrorCode ExpFitCoef80_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, 
     Codes: ErrSizeMismatch (the arrays differ in length), ErrFewerThanTwo (less than two samples),
     ErrNonFiniteInput (a weight is NaN), ErrTooFewWeights (all weights but one are 0),
     ErrNotStrictlyPositive (an x is not above 0), ErrPolynomialOrderTooHigh (less than two values
-    have the sign of most), ErrNonFiniteInput (a sample or a step's power is not finite), ErrOutOfMemory (no
-    memory), ErrIterationLimit (singular values do not converge), WarnFitIncomplete (the guess has
-    neither no values nor two). */
+    have the sign of most), ErrNonFiniteInput (a sample or a step's power is not finite),
+    ErrOutOfMemory (no memory), ErrIterationLimit (singular values do not converge),
+    WarnFitIncomplete (the guess has neither no values nor two). */
 QX_API ErrorCode PowerFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, double tolerance,
                                QX_IN DBL1D guess, QX_OUT double *a, QX_OUT double *b,
                                QX_OUT double *mse, QX_INOUT int32_t *iterations, double floor);
@@ -99,9 +101,9 @@ QX_API ErrorCode LogFitCoef_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, do
     of its height is taken through three points, and *iterations is 0.
     Codes: ErrSizeMismatch (the arrays differ in length), ErrFewerThanThree (less than three
     samples), ErrNonFiniteInput (a weight is NaN), ErrTooFewWeights (less than three weights are not
-    0), ErrNonFiniteInput (an x is not finite), ErrFitStartValues (the deviation to start from is 0, or a lone peak
-    has no neighbour of its sign on a side), ErrOutOfMemory (no memory), WarnFitIncomplete (the
-    guess has neither no values nor three). */
+    0), ErrNonFiniteInput (an x is not finite), ErrFitStartValues (the deviation to start from is 0,
+    or a lone peak has no neighbour of its sign on a side), ErrOutOfMemory (no memory),
+    WarnFitIncomplete (the guess has neither no values nor three). */
 QX_API ErrorCode GaussianPeakFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w,
                                       double tolerance, QX_IN DBL1D guess, QX_OUT double *a,
                                       QX_OUT double *c, QX_OUT double *s, QX_OUT double *mse,

@@ -20,10 +20,10 @@ QX_BEGIN_DECLS
    with the first input. The size of state is n - 1, ceil(n / L), ceil(n / M) + 1 or ceil(n / L) by
     mode. A change of h or of the rates is noticed by that size alone.
     Codes: ErrOrderNotPositive (h is empty), ErrNotStrictlyPositive (L or M below 1),
-    ErrInvalidSelector (no such mode), ErrNegativeSetting (delayLeft is negative and no
-    reset is in force), ErrBadTapCount (a reset is to remove the delay of an even number of taps), ErrStateSizeMismatch (state has
-    another size and no reset is in force), ErrOutOfMemory (no memory), WarnEmptyResult (x is
-    empty). */
+    ErrInvalidSelector (no such mode), ErrNegativeSetting (delayLeft is negative and no reset is in
+    force), ErrBadTapCount (a reset is to remove the delay of an even number of taps),
+    ErrStateSizeMismatch (state has another size and no reset is in force), ErrOutOfMemory (no
+    memory), WarnEmptyResult (x is empty). */
 QX_API ErrorCode ppMultiRateFIRH_DBL(QX_IN DBL1D x, QX_OUT DBL1D y, QX_INOUT DBL1D state,
                                      int32_t mode, int32_t L, int32_t M, QX_IN DBL1D h, double gain,
                                      QX_IN const uint8_t *reset, QX_IN const uint8_t *removeDelay,

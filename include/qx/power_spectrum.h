@@ -38,9 +38,9 @@ QX_API ErrorCode CrossSpectrumH_IDP(QX_IN DBL1D x, QX_IN DBL1D y, QX_OUT CDB1D c
                                     QX_INOUT InstanceWord *instance);
 
 /** The cross spectrum of complex data: cross[k] = conj(X[k]) Y[k] / n^2, n values.
-    Codes: ErrEmptyInput (x or y is empty), ErrSizeMismatch (their sizes differ), ErrInternal (the
-    word holds something else than a plan), ErrOutOfMemory (the host refuses the output, or no
-    memory). */
+    Codes: ErrEmptyInput (x or y is empty), ErrSizeMismatch (their sizes differ), ErrOutOfMemory
+    (the host refuses the output), ErrInternal (the word holds something else than a plan),
+    ErrOutOfMemory (no memory). */
 QX_API ErrorCode CxCrossSpectrumH(QX_IN CDB1D x, QX_IN CDB1D y, QX_OUT CDB1D cross,
                                   QX_INOUT PlanSlot *slot);
 /** As CxCrossSpectrumH, with its plan in the host's instance data. */

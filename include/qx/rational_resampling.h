@@ -20,8 +20,9 @@ QX_BEGIN_DECLS
     caller set it, and half of n - 1 makes the first output the first one with a full window. The
     taps are not checked for symmetry, without which the result is a correlation.
     Codes: ErrNegativeSetting (*offset or *stateCount is negative), ErrNotStrictlyPositive (L or M
-    below 1), ErrOverflow (the positions of the block may exceed 31 bits, or state has no room for
-    what is left), ErrBadTapCount (h is empty or of even size), ErrOutOfMemory (no memory). */
+    below 1), ErrOutOfMemory (the host refuses the state), ErrOverflow (the positions of the block
+    may exceed 31 bits), ErrOutOfMemory (the host refuses y), ErrBadTapCount (h is empty or of even
+    size), ErrOverflow (state has no room for what is left), ErrOutOfMemory (no memory). */
 QX_API ErrorCode RationalResample_H(QX_IN DBL1D x, int32_t L, int32_t M, int32_t reset,
                                     QX_INOUT int32_t *offset, QX_IN DBL1D h, QX_INOUT DBL1D state,
                                     QX_INOUT int32_t *stateCount, QX_OUT DBL1D y);
@@ -33,9 +34,10 @@ QX_API ErrorCode CxRationalResample_H(QX_IN CDB1D x, int32_t L, int32_t M, int32
 /** As RationalResample_H, for channels in the rows of matrices, which share their positions. An
     empty state begins a stream as well, with *stateCount as it is.
     Codes: ErrNegativeSetting (*offset or *stateCount is negative), ErrNotStrictlyPositive (L or M
-    below 1), ErrSizesDisagree (state has not as many rows as x), ErrOverflow (the positions of the
-    block may exceed 31 bits, or state has no room for what is left), ErrBadTapCount (h is empty or
-    of even size), ErrOutOfMemory (no memory). */
+    below 1), ErrSizesDisagree (state has not as many rows as x), ErrOutOfMemory (the host refuses
+    the state), ErrOverflow (the positions of the block may exceed 31 bits), ErrOutOfMemory (the
+    host refuses y), ErrBadTapCount (h is empty or of even size), ErrOverflow (state has no room for
+    what is left), ErrOutOfMemory (no memory). */
 QX_API ErrorCode RationalResampleMultiCh_H(QX_IN DBL2D x, int32_t L, int32_t M, int32_t reset,
                                            QX_INOUT int32_t *offset, QX_IN DBL1D h,
                                            QX_INOUT DBL2D state, QX_INOUT int32_t *stateCount,

@@ -18,14 +18,14 @@ QX_API ErrorCode NumWinConstH(QX_IN DBL1D window, QX_OUT WindowConstants *consta
     memory: in time that grows with n, for selector 61 with n log n. The parameter is used as it
     stands; that of selector 61 is a linear ratio. With code 0 constants are NaN where the window is
     (a parameter out of its range), and enbw for the triangle of a single sample, which is 0.
-    Codes: ErrEmptyInput (n is below 1), ErrInvalidSelector (another selector), ErrOutOfMemory (no
-    scratch memory or no plan). Both constants are then NaN. */
+    Codes: ErrEmptyInput (n is below 1), ErrOutOfMemory (no scratch memory or no plan),
+    ErrInvalidSelector (another selector). Both constants are then NaN. */
 QX_API ErrorCode WinConstByNameH(int32_t n, int32_t selector, double param,
                                  QX_OUT WindowConstants *constants);
 /** As WinConstByNameH, with the parameter taken as AllWinH takes it: a NaN, for selectors 61 and 62
     also a negative value, means the default, and that of selector 61 is in decibels.
-    Codes: ErrEmptyInput (n is below 1), ErrInvalidSelector (another selector), ErrOutOfMemory (no
-    scratch memory or no plan). Both constants are then NaN. */
+    Codes: ErrEmptyInput (n is below 1), ErrOutOfMemory (no scratch memory or no plan),
+    ErrInvalidSelector (another selector). Both constants are then NaN. */
 QX_API ErrorCode WinConstByNameH_2016(int32_t n, int32_t selector, double param,
                                       QX_OUT WindowConstants *constants);
 

@@ -142,8 +142,8 @@ QX_API ErrorCode CxAllCosWinH(QX_INOUT CDB1D x, int32_t selector, int32_t scaled
 
 /** Any window that has a symmetric form. selector: 0 to 9; 11; 30 to 34; 60 to 62. The parameter is
     used as it stands; that of selector 61 is a linear ratio.
-    Codes: ErrEmptyInput (x is empty), ErrInvalidSelector (another selector (unless x has a single
-    sample)), ErrOutOfMemory (no scratch memory or no plan). */
+    Codes: ErrEmptyInput (x is empty), ErrOutOfMemory (no scratch memory or no plan),
+    ErrInvalidSelector (another selector (unless x has a single sample)). */
 QX_API ErrorCode SymmWinH(QX_INOUT DBL1D x, int32_t selector, double param);
 /** As SymmWinH, for complex samples. */
 QX_API ErrorCode CxSymmWinH(QX_INOUT CDB1D x, int32_t selector, double param);
@@ -153,8 +153,8 @@ QX_API ErrorCode CxSymmWinH(QX_INOUT CDB1D x, int32_t selector, double param);
     values, so x may be empty there. The parameter is used as it stands; that of selector 61 is a
     linear ratio.
     Codes: ErrNegativeDimension (x says a negative size; `constants` stay as they are),
-    ErrInvalidSelector (another selector), ErrEmptyInput (x is empty), ErrOutOfMemory (no
-    scratch memory or no plan). */
+    ErrOutOfMemory (no scratch memory or no plan), ErrInvalidSelector (another selector),
+    ErrEmptyInput (x is empty). */
 QX_API ErrorCode ScaledWinH(QX_INOUT DBL1D x, int32_t selector, double param,
                             QX_OUT WindowConstants *constants);
 /** As ScaledWinH, for complex samples. */
