@@ -14,8 +14,8 @@
    Three Euler angles turn the system three times, each time about an axis of the system as it has
    been turned so far, in the order of the angles by sequence:
 
-       0 XYX   1 XYZ   2 XZX   3 XZY   4 YXY   5 YXZ   6 YZX   7 YZY   8 ZXY   9 ZXZ   10 ZYX
-       11 ZYZ
+       0 XYX   1 XYZ   2 XZX   3 XZY   4 YXY   5 YXZ
+       6 YZX   7 YZY   8 ZXY   9 ZXZ   10 ZYX   11 ZYZ
 
    and the direction matrix is R = R3 R2 R1. For example, with angles 1, 2, 3 as indices of c and s,
    under sequence 10 (ZYX: yaw, pitch, roll) R is

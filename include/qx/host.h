@@ -80,9 +80,9 @@ QX_HOST_API int32_t QXHostReleaseObject(void *object);
 QX_HOST_API const char *QXHostErrorText(ErrorCode code);
 QX_HOST_API const char *QXHostErrorName(ErrorCode code);
 
-/* Calls an export of complex numbers for each of `count` elements, for interpreters, in which a call
-   takes longer than such a function: function(z + i, selector[i], result + i), with an order before
-   it in the second form. codes[i] is what call i returned. */
+/* Calls an export of complex numbers for each of `count` elements, for interpreters, in which a
+   call takes longer than such a function: function(z + i, selector[i], result + i), with an order
+   before it in the second form. codes[i] is what call i returned. */
 typedef ErrorCode (*QXHostOfComplex)(const CDB *z, int32_t selector, CDB *result);
 typedef ErrorCode (*QXHostOfOrderAndComplex)(double order, const CDB *z, int32_t selector,
                                              CDB *result);
