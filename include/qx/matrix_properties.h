@@ -72,7 +72,7 @@ QX_API int32_t Trace_head(QX_IN DBL2D a, QX_OUT DBL *trace, QX_OUT ErrorCode *er
 QX_API int32_t CxTrace_head(QX_IN CDB2D a, QX_OUT CDB *trace, QX_OUT ErrorCode *err);
 
 /** Sum of x[i] y[i], in ascending order.
-    Codes: ErrEmptyInput (x or y is empty), ErrSizeMismatch (the lengths differ). */
+    Codes: ErrSizeMismatch (the lengths differ), ErrEmptyInput (x and y are empty). */
 QX_API int32_t DotProduct_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_OUT DBL *dot,
                                QX_OUT ErrorCode *err);
 /** As DotProduct_head, for complex data; nothing is conjugated. */
