@@ -145,8 +145,8 @@ QX_API ErrorCode CxEqsSetByCholeskyDri_head(QX_IN CDB2D a, int32_t useUpper, QX_
                                             QX_OUT CDB2D x);
 
 /** Solves L L^T x = b in place of b with a packed lower factor of Cholesky_head.
-    Codes: ErrNotSquare (packedFactor is empty, or its length is no n (n+1) / 2), ErrSizeMismatch
-    (b has not n elements). */
+    Codes: ErrNotSquare (the length of packedFactor is no n (n+1) / 2), ErrSizeMismatch (b has not n
+    elements), ErrEmptyInput (packedFactor and b are empty). */
 QX_API int32_t CholeskyLinEqs_head(QX_IN DBL1D packedFactor, QX_INOUT DBL1D b,
                                    QX_OUT ErrorCode *err);
 /** As CholeskyLinEqs_head, for complex data: L L^H x = b. */
@@ -166,9 +166,9 @@ QX_API ErrorCode CxTriEqsSetDri_head(QX_IN CDB2D a, int32_t triangle, QX_IN CDB2
                                      QX_OUT CDB2D x);
 
 /** As TriEqsSetDri_head, for a packed triangle and in place of b, with the code in *err.
-    Codes: ErrInvalidSelector (triangle is neither 0 nor 1), ErrNotSquare (a is empty, or its length
-    is no n (n+1) / 2), ErrSizeMismatch (b has not n elements), ErrNonFiniteInput (a or b holds NaN
-    or infinity), ErrSingularMatrix (as there). */
+    Codes: ErrInvalidSelector (triangle is neither 0 nor 1), ErrNotSquare (the length of a is no n
+    (n+1) / 2), ErrSizeMismatch (b has not n elements), ErrEmptyInput (a and b are empty),
+    ErrNonFiniteInput (a or b holds NaN or infinity), ErrSingularMatrix (as there). */
 QX_API int32_t TriLinEqs_head(QX_IN const PackedTriangle *a, QX_INOUT DBL1D b,
                               QX_OUT ErrorCode *err);
 /** As TriLinEqs_head, for complex data. */

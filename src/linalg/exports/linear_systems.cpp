@@ -156,8 +156,8 @@ template <class Vector>
 Outcome SolveWithCholesky(In<Vector> packedFactor, InOut<Vector> b) {
     const int32_t n = OrderOfPacked(packedFactor.size());
     if (const Outcome bad = LastFailed({{packedFactor.isEmpty() || b.isEmpty(), ErrEmptyInput},
-                                        {n < 1, ErrNotSquare},
-                                        {n >= 1 && b.size() != n, ErrSizeMismatch}}))
+                                        {n < 0, ErrNotSquare},
+                                        {n >= 0 && b.size() != n, ErrSizeMismatch}}))
         return bad;
     return Substitute(Factors::cholesky, packedFactor.data(), n, 1, b.data());
 }
@@ -188,8 +188,8 @@ Outcome SolveTriangle(In<Vector> packed, int32_t triangle, InOut<Vector> b) {
     const int32_t n = OrderOfPacked(packed.size());
     if (const Outcome bad = LastFailed(
             {{packed.isEmpty() || b.isEmpty(), ErrEmptyInput},
-             {n < 1, ErrNotSquare},
-             {n >= 1 && b.size() != n, ErrSizeMismatch},
+             {n < 0, ErrNotSquare},
+             {n >= 0 && b.size() != n, ErrSizeMismatch},
              {triangle != lowerTriangle && triangle != upperTriangle, ErrInvalidSelector}}))
         return bad;
     return SolveTriangular(packed.data(), n, triangle, 1, b.data());

@@ -318,6 +318,24 @@ TEST(Cholesky, SolvesFromEitherTriangle) {
     EXPECT_EQ(err, ErrNotSquare);
 }
 
+// No elements are the triangle of order 0.
+TEST(Packed, EmptyTrianglesAreEmptyAndFitNoRightSide) {
+    for (const int n : {0, 3}) {
+        const ErrorCode expected = n == 0 ? ErrEmptyInput : ErrSizeMismatch;
+        DBLVector packed(0), b(n), again(n);
+        CDBVector cxPacked(0), z(n), cxAgain(n);
+        const PackedTriangle a = {packed.handle(), 0};
+        const CxPackedTriangle cxA = {cxPacked.handle(), 0};
+        ErrorCode err[4] = {};
+        CholeskyLinEqs_head(packed.handle(), b.handle(), &err[0]);
+        CxCholeskyLinEqs_head(cxPacked.handle(), z.handle(), &err[1]);
+        TriLinEqs_head(&a, again.handle(), &err[2]);
+        CxTriLinEqs_head(&cxA, cxAgain.handle(), &err[3]);
+        for (const ErrorCode each : err)
+            EXPECT_EQ(each, expected) << n;
+    }
+}
+
 template <class Matrix, class T, class Export>
 void ExpectTriangularSolutions(int n, int triangle, std::vector<T> a, const std::vector<T> &b,
                                Export solve) {
