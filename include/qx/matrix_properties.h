@@ -12,12 +12,13 @@ QX_BEGIN_DECLS
 
 /** Determinant of a square matrix. matrixType: 0 general (LU); 1 positive definite (Cholesky, of
     which the lower triangle is read); 2 lower triangular; 3 upper triangular (the product of the
-    diagonal). One of order 2 is computed by the formula whatever the type. It is 0 for a matrix
-    that is singular or, of type 1, not positive definite. Products that overflow make it infinite
+    diagonal). One of order 2 is computed by the formula whatever the type. That of a singular
+    matrix is 0 where the elimination meets an exact zero. Products that overflow make it infinite
     or NaN.
     Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrInvalidSelector
     (*matrixType is not 0 to 3), ErrNonFiniteInput (a holds NaN or infinity), ErrOutOfMemory (no
-    memory). */
+    memory), ErrNotPositiveDefinite (*matrixType is 1, the order is not 2, and a is not positive
+    definite, or nearly not). */
 QX_API int32_t Determinant_head(QX_IN DBL2D a, QX_IN const int32_t *matrixType, QX_OUT DBL *det,
                                 QX_OUT ErrorCode *err);
 /** As Determinant_head, for complex data. */

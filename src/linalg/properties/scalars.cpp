@@ -57,13 +57,8 @@ ErrorCode DeterminantByCholesky(const ElementOf<E> *a, int32_t n, ElementOf<E> *
     if (const ErrorCode failed = packed.allocate(PackedLength(n)))
         return failed;
     PackMatrix(a, n, symmetric, packed.data());
-    const ErrorCode status = PackedCholesky(packed.data(), n);
-    if (status == ErrNotPositiveDefinite) {
-        *det = ScalarOf<E>::Of(0.0);
-        return 0;
-    }
-    if (status != 0)
-        return status;
+    if (const ErrorCode failed = PackedCholesky(packed.data(), n))
+        return failed;
     auto product = ScalarOf<E>::Of(1.0);
     std::ptrdiff_t diagonal = 0;
     for (std::ptrdiff_t j = 0; j < n; ++j) {

@@ -13,8 +13,8 @@ namespace qx {
 enum class MatrixType : int32_t { general, positiveDefinite, lowerTriangular, upperTriangular };
 
 // The determinant: a formula for n = 2 whatever the type; else by LU, Cholesky or the diagonal
-// alone. 0 for a matrix that is singular or, of the second type, not positive definite.
-// ErrEmptyInput, ErrInvalidSelector, ErrNonFiniteInput, ErrOutOfMemory.
+// alone. 0 for a singular matrix of the first type.
+// ErrEmptyInput, ErrInvalidSelector, ErrNonFiniteInput, ErrOutOfMemory, ErrNotPositiveDefinite.
 ErrorCode MatrixDeterminant(const DBL *a, int32_t n, int32_t matrixType, DBL *det);
 ErrorCode MatrixDeterminant(const CDB *a, int32_t n, int32_t matrixType, CDB *det);
 
