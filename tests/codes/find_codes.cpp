@@ -17,7 +17,10 @@
 // and then two, and writes them as lines of tests/codes/witnesses.txt. What has not been found, and
 // pairs of which always the later code wins, go to the standard error.
 //
-//     find_codes MODULE [--only EXPORT] [--tries N]
+//     find_codes MODULE [--only EXPORT] [--tries N] [--code CODE]
+//
+// With --code it looks for that one alone, with numbers of all sizes: the quick way to what does
+// not converge.
 
 namespace qx::test {
 
@@ -27,6 +30,7 @@ constexpr std::size_t mostBases = 40, mostAlternatives = 24;
 constexpr int32_t largestSize = 60;
 constexpr unsigned secondsPerExport = 240;
 int32_t tries = 3000;
+ErrorCode onlyCode = 0;
 
 struct Base {
     const Recipe *recipe;
@@ -173,12 +177,26 @@ std::vector<Spoils> JointSizes(const Base &base) {
     return all;
 }
 
+Spoils WildSpoils(const Base &base, int32_t seed, bool mirrors) {
+    Spoils spoils;
+    for (const SpoilPlace &place : base.places) {
+        const bool isReal = place.element == "DBL" || place.element == "CDB";
+        const bool hasElements = std::count(place.sizes.begin(), place.sizes.end(), 0) == 0;
+        if (!isReal || !hasElements || place.dimensions == 0 || place.dimensions == 3)
+            continue;
+        spoils.push_back({place.name, "wild " + std::to_string(seed++)});
+        if (mirrors && place.dimensions == 2 && place.sizes[0] == place.sizes[1])
+            spoils.push_back({place.name, "mirror"});
+    }
+    return spoils;
+}
+
 class Search {
 public:
     Search(const Interceptable &target, std::vector<Base> bases)
         : target_(target), bases_(std::move(bases)) {
         for (const ErrorCode code : target.codes)
-            if (code != ErrOutOfMemory)
+            if (code != ErrOutOfMemory && (onlyCode == 0 || code == onlyCode))
                 wanted_.push_back(code);
     }
 
@@ -210,6 +228,14 @@ public:
                     random.below(static_cast<int32_t>(spoils[b].size())))]);
             look(b, some);
         }
+    }
+    // Numbers of all sizes in all arrays, and as a last resort in symmetric matrices: iterations
+    // that do not converge.
+    void wild() {
+        for (int32_t seed = 1; seed <= tries / 6; ++seed)
+            for (std::size_t b = 0; b < bases_.size() && !missing().empty(); ++b)
+                for (const bool mirrors : {false, true})
+                    look(b, WildSpoils(bases_[b], seed, mirrors));
     }
     // Two faults at once, for each pair of codes.
     void pairs() {
@@ -344,9 +370,12 @@ std::vector<Base> BasesOf(const Interceptable &target) {
 void SearchIn(const Interceptable &target) {
     alarm(secondsPerExport);
     Search search(target, BasesOf(target));
-    search.singles();
     Random random(1);
-    search.several(random);
+    if (onlyCode == 0) {
+        search.singles();
+        search.several(random);
+    }
+    search.wild();
     search.pairs();
     search.write();
     std::fflush(stdout);
@@ -360,6 +389,8 @@ int Main(int count, char **words) {
             only = words[i + 1];
         else if (std::string(words[i]) == "--tries")
             tries = std::atoi(words[i + 1]);
+        else if (std::string(words[i]) == "--code")
+            onlyCode = AllCodes().at(words[i + 1]);
         else
             return 2;
     }
@@ -393,6 +424,7 @@ int Main(int count, char **words) {
 int main(int count, char **words) {
     const int status = qx::test::Main(count, words);
     if (status == 2)
-        std::fprintf(stderr, "usage: find_codes MODULE [--only EXPORT] [--tries N]\n");
+        std::fprintf(stderr,
+                     "usage: find_codes MODULE [--only EXPORT] [--tries N] [--code CODE]\n");
     return status;
 }

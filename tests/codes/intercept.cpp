@@ -157,6 +157,36 @@ bool Fill(const Located &place, const std::function<double(int64_t, double)> &va
     return count > 0;
 }
 
+// The number i of those that `seed` stands for: their range and how many are 0 change with it.
+double Wild(uint64_t seed, int64_t i) {
+    constexpr int range[] = {1000, 500, 100, 330, 1000, 0};
+    constexpr double zeros[] = {0, 0, 0.3, 0.6};
+    Noise noise(seed * 1000003 + static_cast<uint64_t>(i));
+    if (noise.positive() < zeros[seed / 6 % 4])
+        return 0;
+    const int most = range[seed % 6];
+    const double place = noise.symmetric();
+    const int exponent =
+        most > 0 ? static_cast<int>(most * place) : 1011 + static_cast<int>(12 * place);
+    return std::ldexp(noise.symmetric(), exponent);
+}
+
+bool Mirror(const Located &place) {
+    const std::vector<int32_t> sizes = SizesOf(place);
+    if (sizes.size() != 2 || sizes[0] != sizes[1] || PartOf(place.element) != "DBL")
+        return false;
+    const int parts = IsComplex(place.element) ? 2 : 1;
+    auto *elements = reinterpret_cast<DBL *>(BlockOf(place) + 8);
+    const int32_t n = sizes[0];
+    for (int32_t i = 0; i < n; ++i)
+        for (int32_t j = 0; j <= i; ++j) {
+            elements[parts * (j * n + i)] = elements[parts * (i * n + j)];
+            if (parts == 2)
+                elements[2 * (j * n + i) + 1] = i == j ? 0 : -elements[2 * (i * n + j) + 1];
+        }
+    return true;
+}
+
 bool Apply(const std::string &action, const Located &place, const std::vector<Located> &all) {
     std::istringstream words(action);
     std::string verb, word;
@@ -191,6 +221,12 @@ bool Apply(const std::string &action, const Located &place, const std::vector<Lo
             const auto t = static_cast<double>(i);
             return std::sin(0.37 * t) * (1.0 + 1e-3 * t);
         });
+    if (verb == "wild") {
+        int64_t at = 0;
+        return Fill(place, [&](int64_t, double) { return Wild(std::stoull(word), at++); });
+    }
+    if (verb == "mirror")
+        return Mirror(place);
     if (verb == "at") {
         std::string value;
         words >> value;

@@ -73,6 +73,8 @@ T Typed(void *plain) {
 //     x scale 1e300     x first              0 but for the first element
 //     x up    x down    ascending or descending whole numbers
 //     x wave            a growing sine, of which no value comes twice
+//     a wild 5          powers of 2 of all sizes times noise, and zeros, by that seed
+//     a mirror          the lower triangle over the upper one: a symmetric or Hermitian matrix
 //     order = -1        y is x               another value; the same array
 //     slot foreign      ref null             a word that holds no cell of ours; a null pointer
 struct Spoil {
