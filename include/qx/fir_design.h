@@ -71,12 +71,13 @@ typedef struct NarrowFIRDesign {
 /** Designs a filter for a narrow band, whose response stays within passRipple (linear) of 1 and
     below stopAttenuation (dB). type: 0 lowpass; 1 highpass, both with the edges fPass and
     fStop; 2 bandpass; 3 bandstop, both with the widths fPass and fStop about fCenter. The stretch M
-   is the one that takes the fewest taps, by an estimate; each stage is then made longer until it
-   has half the ripple. A failure empties the arrays and sets M to 0. Codes: ErrBadDesignField (no
-   such type, edges out of order, a ripple not above 0, or one so large that fewer than 3 taps do),
-   ErrBadCutoff (a band about fCenter that does not lie above 0 and below fs / 2), ErrAboveNyquist
-   (the same), ErrOutOfMemory (no memory, a stage of more than about 4090 taps, or the host refuses
-   an array; its status is the function result). */
+    is the one that takes the fewest taps, by an estimate; each stage is then made longer until it
+    has half the ripple. A failure empties the arrays and sets M to 0.
+    Codes: ErrBadDesignField (no such type, edges out of order, a ripple not above 0, or one so
+    large that fewer than 3 taps do), ErrBadCutoff (a band about fCenter that does not lie above 0
+    and below fs / 2), ErrAboveNyquist (fs is some 1e-322, so small that its half is rounded up),
+    ErrOutOfMemory (no memory, a stage of more than about 4090 taps, or the host refuses an array;
+    its status is the function result). */
 QX_API int32_t FIRNarrowCoef_head(QX_IN const double *fs, QX_IN const double *fPass,
                                   QX_IN const double *fStop, QX_IN const double *fCenter,
                                   QX_IN const double *passRipple,

@@ -112,7 +112,7 @@ QX_API int32_t EllipticCoefs90(QX_IN const double *fs, QX_IN const double *fl,
     ErrOutOfMemory (the host refuses an array, or no memory), ErrBadCutoff (a frequency is not above
     0, or fl is not below fh; for lowpass and highpass also a cut-off at half the sampling rate or
     above), ErrAboveNyquist (a cut-off is above half the sampling rate), ErrInvalidSelector (no such
-    type), ErrBadCoefficients (an order above 150, whose polynomial leaves the numbers),
+    type), ErrBadCoefficients (an order of 150 or above, whose polynomial leaves the numbers),
     ErrIterationLimit (poles that are not found), ErrNonFiniteFunction (the same),
     ErrDegenerateValue (the same). */
 QX_API int32_t BesselCoefs(QX_IN const double *fs, QX_IN const double *fl, QX_IN const double *fh,
