@@ -188,6 +188,9 @@ void PrintScenario(const Scenario &scenario) {
                             ? std::vector<int32_t>{argument.cols}
                             : std::vector<int32_t>{argument.rows, argument.cols},
                         argument.bytes.data(), parameter.isIn ? argument.bytes.size() : 0});
+            if (argument.saysNegativeSize())
+                std::printf("    but says %d rows, %d columns, of which 0 is the truth\n",
+                            argument.claims[0], argument.claims[1]);
         } else if (parameter.kind == Kind::Value) {
             std::printf("  %s = %" PRId64 ", or %.17g (%a) if it is real\n", parameter.name,
                         argument.whole, argument.real, argument.real);
@@ -239,6 +242,19 @@ void CallByCatalogue(Case &one, const Thunk &thunk, Random &random) {
     }
 }
 
+void PrintSpecial(const RecipeSpoiling &spoiling) {
+    if (spoiling.claimed < 0 && spoiling.claimsBoth)
+        std::printf("  each dimension of input %d says %d\n", spoiling.input, spoiling.claimed);
+    else if (spoiling.claimed < 0)
+        std::printf("  dimension %d of input %d says %d\n", spoiling.dimension, spoiling.input,
+                    spoiling.claimed);
+    if (!spoiling.shared)
+        return;
+    const auto &[first, second] = spoiling.shared->first;
+    std::printf("  %s %d and %s %d are one array\n", first.isOutput ? "output" : "input",
+                first.number, second.isOutput ? "output" : "input", second.number);
+}
+
 void CallByRecipe(Case &one, const Recipe &recipe, const RecipeSpoiling &spoiling) {
     if (orders.show) {
         std::printf("call of %s, n = %d\n", recipe.name.c_str(), spoiling.n);
@@ -247,6 +263,7 @@ void CallByRecipe(Case &one, const Recipe &recipe, const RecipeSpoiling &spoilin
         if (spoiling.size >= 0)
             std::printf("  dimension %d of input %d is %d\n", spoiling.dimension, spoiling.input,
                         spoiling.size);
+        PrintSpecial(spoiling);
         PrintDisturbance(spoiling.disturbance);
     }
     Call call(spoiling.n);

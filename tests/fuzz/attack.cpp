@@ -153,6 +153,11 @@ void CheckHost() {
     }
 }
 
+void CheckRefusal(ErrorCode status, bool hasStatus) {
+    if (hasStatus && status != ErrInternal)
+        Tell("one array for two outputs is not refused (%d)", status);
+}
+
 void CheckRepetition(const char *name, const Outcome &first, const Outcome &second, bool shares) {
     if (IsKept(name, Oddity::OldContentStays) || IsKept(name, Oddity::DependsOnState))
         return;

@@ -74,6 +74,8 @@ void CheckStatus(const char *name, ErrorCode status, const Disturbance &disturba
 // Tells of a touched byte outside the blocks, and ends the process: what comes after it would tell
 // nothing.
 void CheckHost();
+// Tells where an array that the call writes in two places is not refused.
+void CheckRefusal(ErrorCode status, bool hasStatus);
 // The same call, made twice, has to have the same outcome.
 void CheckRepetition(const char *name, const Outcome &first, const Outcome &second, bool shares);
 

@@ -35,7 +35,10 @@ Outcome CallAndCheck(const Scenario &scenario, Node &node, const Manner &manner)
     PreparedCall call(scenario, node, manner);
     const ErrorCode status =
         call.status(Attacked(scenario.disturbance, manner.rubbish, [&call] { return call(); }));
-    CheckStatus(thunk.name, status, scenario.disturbance, scenario.shares());
+    if (scenario.writesOneTwice() && !IsKept(thunk.name, Oddity::WorksInInput))
+        CheckRefusal(status, call.hasStatus());
+    else
+        CheckStatus(thunk.name, status, scenario.disturbance, scenario.shares());
     CheckHost();
     for (std::size_t i = 0; i < thunk.parameters.size(); ++i) {
         const Parameter &parameter = thunk.parameters[i];
@@ -68,7 +71,10 @@ void RunThunkCase(const Thunk &thunk, Random &random, Tally &tally) {
     for (int32_t left = 1 + random.below(3); left > 0; --left) {
         const Scenario scenario = SomeScenario(random, thunk);
         const bool shares = scenario.shares();
-        const bool again = scenario.disturbance.isNone() && (shares || random.oneIn(4));
+        const bool isRefused = scenario.writesOneTwice();
+        const bool says = scenario.saysNegativeSize();
+        const bool again =
+            scenario.disturbance.isNone() && !isRefused && (shares || says || random.oneIn(4));
         Outcome outcome;
         {
             const TinyWorkspace workspace(scenario.disturbance.workspace);
@@ -81,8 +87,9 @@ void RunThunkCase(const Thunk &thunk, Random &random, Tally &tally) {
         tally.successes += outcome.status >= 0;
         if (!again)
             continue;
-        const Outcome second = CallAlone(scenario, {shares, 0xC2});
-        CheckRepetition(thunk.name, outcome, second, shares);
+        const Outcome second = CallAlone(scenario, {shares, 0xC2, says});
+        if (!says || !IsCodeOfNegativeSize(thunk.name, outcome.status))
+            CheckRepetition(thunk.name, outcome, second, shares);
     }
 }
 

@@ -4,8 +4,24 @@
 
 #include <algorithm>
 #include <cstring>
+#include <limits>
 
 namespace qx::test {
+
+namespace {
+
+// Two arrays of one type, as a call without a fault has them.
+std::optional<std::pair<Call::Pair, Call::Meeting>> SomePair(Random &random, const Recipe &recipe,
+                                                             int32_t n) {
+    Call probe(n);
+    Observe({}, 0x17, [&] { return recipe.run(probe); });
+    const auto pairs = probe.pairsOfOneType();
+    if (pairs.empty())
+        return std::nullopt;
+    return pairs[static_cast<std::size_t>(random.below(static_cast<int32_t>(pairs.size())))];
+}
+
+} // namespace
 
 RecipeSpoiling SomeSpoiling(Random &random, const Recipe &recipe) {
     RecipeSpoiling some = {};
@@ -23,6 +39,14 @@ RecipeSpoiling SomeSpoiling(Random &random, const Recipe &recipe) {
     const int32_t others[] = {0, 1, 2, 3, some.n - 1, some.n + 1, some.n / 2, 2 * some.n};
     some.size = random.oneIn(2) ? random.oneOf(others) : -1;
     some.disturbance = SomeDisturbance(random);
+    const int32_t negatives[] = {-1, -2, -some.n - 1, -65536, std::numeric_limits<int32_t>::min()};
+    if (random.oneIn(10)) {
+        some.claimed = random.oneOf(negatives);
+        some.claimsBoth = random.oneIn(2);
+        some.input = random.below(5);
+    } else if (random.oneIn(6)) {
+        some.shared = SomePair(random, recipe, some.n);
+    }
     return some;
 }
 
@@ -65,7 +89,7 @@ void SpoilElements(Random &random, unsigned char *elements, ElementType element,
 
 } // namespace
 
-void Spoil(Call &call, const RecipeSpoiling &spoiling) {
+void Spoil(Call &call, const RecipeSpoiling &spoiling, Made made) {
     if (spoiling.spoilsContent)
         call.spoil([content = Random(spoiling.seed)](unsigned char *elements, ElementType element,
                                                      int32_t rows, int32_t cols) mutable {
@@ -74,25 +98,47 @@ void Spoil(Call &call, const RecipeSpoiling &spoiling) {
         });
     if (spoiling.size >= 0)
         call.alter(spoiling.input, spoiling.dimension, spoiling.size);
+    if (spoiling.claimed < 0)
+        call.claim(spoiling.input, spoiling.claimsBoth ? Call::all : spoiling.dimension,
+                   made == Made::Otherwise ? 0 : spoiling.claimed);
+    if (spoiling.shared && made == Made::Otherwise)
+        call.keepApart(spoiling.shared->first);
+    else if (spoiling.shared)
+        call.share(spoiling.shared->first);
 }
 
 namespace {
 
-Outcome RunOnce(const Recipe &recipe, const RecipeSpoiling &spoiling, unsigned char rubbish) {
+bool IsRefused(const RecipeSpoiling &spoiling) {
+    return spoiling.shared && spoiling.shared->second == Call::Meeting::WrittenTwice;
+}
+
+// Two inputs that are one may be taken another way, and of an array that is written by the way
+// nothing is promised.
+bool IsRepeatable(const RecipeSpoiling &spoiling) {
+    return spoiling.disturbance.isNone() &&
+           (!spoiling.shared || spoiling.shared->second == Call::Meeting::ReadAndWritten);
+}
+
+Outcome RunOnce(const Recipe &recipe, const RecipeSpoiling &spoiling, unsigned char rubbish,
+                Made made) {
     Call call(spoiling.n);
-    Spoil(call, spoiling);
+    Spoil(call, spoiling, made);
     const std::string name = recipe.exportName();
     const int32_t result =
         Attacked(spoiling.disturbance, rubbish, [&] { return recipe.run(call); });
     const ErrorCode status = call.status(result);
-    CheckStatus(name.c_str(), status, spoiling.disturbance, false);
+    if (IsRefused(spoiling))
+        CheckRefusal(status, (recipe.quirks & NoStatus) == 0);
+    else if (status != ErrInternal || !spoiling.shared)
+        CheckStatus(name.c_str(), status, spoiling.disturbance, spoiling.shared.has_value());
     CheckHost();
     if (!call.sizesFitBlocks()) {
         if (!IsKept(name.c_str(), Oddity::SizeBeyondBlock))
             Tell("the sizes of an array exceed its block");
         return {status, 0};
     }
-    if (!call.inputsAreUnchanged())
+    if (!spoiling.shared && !call.inputsAreUnchanged())
         Tell("an input has changed");
     return {status, status < 0 || status == statusNoMemory ? 0 : call.outputHash(status)};
 }
@@ -101,15 +147,19 @@ Outcome RunOnce(const Recipe &recipe, const RecipeSpoiling &spoiling, unsigned c
 
 Outcome RunRecipeCase(Random &random, const Recipe &recipe) {
     const RecipeSpoiling spoiling = SomeSpoiling(random, recipe);
-    const bool again = spoiling.disturbance.isNone() && random.oneIn(4);
+    const std::string name = recipe.exportName();
+    const bool isSpecial = spoiling.shared || spoiling.claimed < 0;
+    const bool again = IsRepeatable(spoiling) && (isSpecial || random.oneIn(4));
     Outcome outcome;
     {
         const TinyWorkspace workspace(spoiling.disturbance.workspace);
-        outcome = RunOnce(recipe, spoiling, 0x17);
+        outcome = RunOnce(recipe, spoiling, 0x17, Made::AsSpoilt);
     }
-    if (again)
-        CheckRepetition(recipe.exportName().c_str(), outcome, RunOnce(recipe, spoiling, 0xC2),
-                        false);
+    if (!again)
+        return outcome;
+    const Outcome second = RunOnce(recipe, spoiling, 0xC2, Made::Otherwise);
+    if (spoiling.claimed == 0 || !IsCodeOfNegativeSize(name.c_str(), outcome.status))
+        CheckRepetition(name.c_str(), outcome, second, spoiling.shared.has_value());
     return outcome;
 }
 

@@ -5,26 +5,32 @@
 
 #include <algorithm>
 #include <cstring>
+#include <limits>
 #include <map>
 
 namespace qx::test {
 
 namespace {
 
-// An array argument before `at` whose handle it may share: one of the two is an output. Arrays that
-// share the handle of a third do not come into question, so that no two outputs are one.
-int SomeAlias(Random &random, const Scenario &scenario, std::size_t at) {
+// What shares a handle in a call.
+enum class Sharing { Nothing, InputAndOutput, TwoOutputs };
+
+// An array argument before `at` whose handle it may share. Arrays that share the handle of a third
+// do not come into question.
+int SomeAlias(Random &random, const Scenario &scenario, std::size_t at, Sharing sharing) {
     const std::vector<Parameter> &parameters = scenario.thunk->parameters;
+    const auto fit = [sharing](const Parameter &one, const Parameter &other) {
+        return one.kind == other.kind && one.element == other.element &&
+               (sharing == Sharing::TwoOutputs ? one.isOut && other.isOut
+                                               : one.isOut != other.isOut);
+    };
     const auto isShared = [&](std::size_t i) {
         return std::any_of(scenario.arguments.begin(), scenario.arguments.end(),
                            [&](const Argument &a) { return a.aliasOf == static_cast<int>(i); });
     };
     std::vector<int> candidates;
     for (std::size_t i = 0; i < at; ++i)
-        if (parameters[i].kind == parameters[at].kind &&
-            parameters[i].element == parameters[at].element &&
-            parameters[i].isOut != parameters[at].isOut && scenario.arguments[i].aliasOf < 0 &&
-            !isShared(i))
+        if (fit(parameters[i], parameters[at]) && scenario.arguments[i].aliasOf < 0 && !isShared(i))
             candidates.push_back(static_cast<int>(i));
     if (candidates.empty())
         return -1;
@@ -62,6 +68,31 @@ Argument SomeArgument(Random &random, const Parameter &parameter, const Sizes &s
     return argument;
 }
 
+// Lets one array say a negative size, one of two or both, so that their product is positive.
+void ClaimNegativeSize(Random &random, Scenario &scenario) {
+    const std::vector<Parameter> &parameters = scenario.thunk->parameters;
+    const auto at = static_cast<std::size_t>(random.below(static_cast<int32_t>(parameters.size())));
+    Argument &argument = scenario.arguments[at];
+    if (!parameters[at].isArray() || argument.aliasOf >= 0)
+        return;
+    const int32_t negatives[] = {-1, -2, -argument.cols - 1, -65536,
+                                 std::numeric_limits<int32_t>::min()};
+    const int32_t which = parameters[at].dimensions() == 1 ? 1 : random.below(3);
+    if (which != 1)
+        argument.claims[0] = random.oneOf(negatives);
+    if (which != 0)
+        argument.claims[1] = random.oneOf(negatives);
+    for (Argument &other : scenario.arguments)
+        if (other.aliasOf == static_cast<int>(at))
+            std::copy_n(argument.claims, 2, other.claims);
+}
+
+Sharing SomeSharing(Random &random) {
+    return random.oneIn(6)    ? Sharing::InputAndOutput
+           : random.oneIn(16) ? Sharing::TwoOutputs
+                              : Sharing::Nothing;
+}
+
 } // namespace
 
 bool Scenario::shares() const {
@@ -69,18 +100,33 @@ bool Scenario::shares() const {
                        [](const Argument &argument) { return argument.aliasOf >= 0; });
 }
 
+bool Scenario::writesOneTwice() const {
+    for (std::size_t i = 0; i < arguments.size(); ++i) {
+        const int other = arguments[i].aliasOf;
+        if (other >= 0 && thunk->parameters[i].isOut &&
+            thunk->parameters[static_cast<std::size_t>(other)].isOut)
+            return true;
+    }
+    return false;
+}
+
+bool Scenario::saysNegativeSize() const {
+    return std::any_of(arguments.begin(), arguments.end(),
+                       [](const Argument &argument) { return argument.saysNegativeSize(); });
+}
+
 Scenario SomeScenario(Random &random, const Thunk &thunk) {
     const bool isUsual = random.oneIn(2);
     const Sizes sizes = SomeSizes(random);
     Scenario scenario{&thunk, {}, {}};
-    const bool shares = random.oneIn(6);
+    const Sharing sharing = SomeSharing(random);
     for (std::size_t i = 0; i < thunk.parameters.size(); ++i) {
         const Parameter &parameter = thunk.parameters[i];
         Argument argument = SomeArgument(random, parameter, sizes, isUsual);
         if (IsKept(thunk.name, Oddity::TimeFollowsNumber))
             argument.whole %= 2000;
-        if (shares && parameter.isArray()) {
-            argument.aliasOf = SomeAlias(random, scenario, i);
+        if (sharing != Sharing::Nothing && parameter.isArray()) {
+            argument.aliasOf = SomeAlias(random, scenario, i, sharing);
             if (argument.aliasOf >= 0) {
                 const int aliasOf = argument.aliasOf;
                 argument = scenario.arguments[static_cast<std::size_t>(aliasOf)];
@@ -90,6 +136,8 @@ Scenario SomeScenario(Random &random, const Thunk &thunk) {
         scenario.arguments.push_back(std::move(argument));
     }
     scenario.disturbance = SomeDisturbance(random);
+    if (random.oneIn(10) && !thunk.parameters.empty())
+        ClaimNegativeSize(random, scenario);
     return scenario;
 }
 
@@ -109,10 +157,22 @@ Blocks::Blocks(const Scenario &scenario, const Manner &manner) : scenario_(scena
         } else if (parameter(i).isArray()) {
             handle = newArray(parameter(i), argument, isRead(i) ? nullptr : &manner.rubbish);
             own_.push_back(handle);
+            claim(handle, parameter(i).dimensions(), argument, manner);
         }
         handles_.push_back(handle);
+        before_.push_back(handle != nullptr ? sizes(i) : std::vector<int32_t>());
     }
 }
+
+void Blocks::claim(void *handle, int dimensions, const Argument &argument, const Manner &manner) {
+    for (int d = 0; d < dimensions; ++d)
+        if (const int32_t claimed = argument.claims[2 - dimensions + d]; claimed < 0) {
+            const int32_t said = manner.empties ? 0 : claimed;
+            std::memcpy(*static_cast<unsigned char **>(handle) + 4 * d, &said, sizeof said);
+        }
+}
+
+bool Blocks::saysAsBefore(std::size_t i) const { return sizes(i) == before_[i]; }
 
 Blocks::~Blocks() {
     for (void *handle : own_)
@@ -200,6 +260,8 @@ bool PreparedCall::inputIsUnchanged(std::size_t i) const {
     const Parameter &parameter = thunk_.parameters[i];
     if (!parameter.isArray() || parameter.isOut || blocks_.isShared(i) || !sizesFitBlock(i))
         return true;
+    if (scenario_.arguments[i].saysNegativeSize())
+        return blocks_.saysAsBefore(i);
     const std::vector<unsigned char> &before = scenario_.arguments[i].bytes;
     const unsigned char *elements = blocks_.elements(i);
     return std::equal(elements, elements + *blocks_.bytes(i), before.begin(), before.end());
@@ -258,7 +320,7 @@ void MixField(uint64_t &hash, const std::string &element, const unsigned char *b
 
 void ValueHash::add(const OutputValue &value) {
     for (const int32_t size : value.sizes)
-        Mix(sizes_, static_cast<uint32_t>(size));
+        Mix(sizes_, static_cast<uint32_t>(std::max(size, 0)));
     Mix(sizes_, value.bytes);
     const auto record = AllRecords().find(value.element);
     if (record == AllRecords().end()) {

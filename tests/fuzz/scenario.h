@@ -22,6 +22,9 @@ struct Argument {
     int64_t whole = 0;
     double real = 0;
     int aliasOf = -1; // the array argument whose handle this one shares
+    // Negative sizes that the block says in place of `rows` and `cols`; 0 for none.
+    int32_t claims[2] = {0, 0};
+    bool saysNegativeSize() const { return claims[0] < 0 || claims[1] < 0; }
 };
 
 // One call with all that happens around it.
@@ -30,6 +33,9 @@ struct Scenario {
     std::vector<Argument> arguments;
     Disturbance disturbance;
     bool shares() const;
+    // Two arrays that the call writes are one, which every export refuses.
+    bool writesOneTwice() const;
+    bool saysNegativeSize() const;
 };
 Scenario SomeScenario(Random &random, const Thunk &thunk);
 
@@ -42,10 +48,12 @@ struct Node {
 };
 
 // How a call is made. The second time what no result may depend on is another: what memory and
-// outputs hold before, and whether arrays share a handle.
+// outputs hold before, whether arrays share a handle, and whether an array says a negative size or
+// that it is empty.
 struct Manner {
     bool apart = false;
     unsigned char rubbish = 0x17;
+    bool empties = false;
 };
 
 // The blocks of the array arguments.
@@ -62,16 +70,20 @@ public:
     // Of the elements, by the sizes; none where the block has not so many.
     std::optional<std::size_t> bytes(std::size_t i) const;
     bool isShared(std::size_t i) const;
+    // Whether its sizes are those from before the call.
+    bool saysAsBefore(std::size_t i) const;
 
 private:
     const Parameter &parameter(std::size_t i) const { return scenario_.thunk->parameters[i]; }
     unsigned char *block(std::size_t i) const;
     bool isRead(std::size_t i) const;
+    static void claim(void *handle, int dimensions, const Argument &argument, const Manner &manner);
     static void *newArray(const Parameter &parameter, const Argument &argument,
                           const unsigned char *rubbish);
 
     const Scenario &scenario_;
     std::vector<void *> handles_, own_;
+    std::vector<std::vector<int32_t>> before_; // the sizes
 };
 
 // A scenario with its blocks: makes the call and shows what it left.
@@ -80,10 +92,13 @@ public:
     PreparedCall(const Scenario &scenario, Node &node, const Manner &manner);
 
     int32_t operator()() const { return thunk_.call(values_.data()); }
+    bool hasStatus() const { return hasError_ || thunk_.returnsCode; }
     ErrorCode status(int32_t functionResult) const {
         return hasError_ ? error_ : thunk_.returnsCode ? functionResult : 0;
     }
-    bool sizesFitBlock(std::size_t i) const { return blocks_.bytes(i).has_value(); }
+    bool sizesFitBlock(std::size_t i) const {
+        return blocks_.bytes(i).has_value() || blocks_.saysAsBefore(i);
+    }
     bool inputIsUnchanged(std::size_t i) const;
     // An array whose sizes exceed its block is shown without elements.
     std::vector<OutputValue> outputs() const;
@@ -98,7 +113,7 @@ private:
     bool hasError_ = false;
 };
 
-// A NaN counts as a NaN: its sign and payload are the processor's.
+// A NaN counts as a NaN: its sign and payload are the processor's; a negative size as 0.
 class ValueHash {
 public:
     void add(const OutputValue &value);

@@ -223,7 +223,9 @@ bool Call::sizesFitBlocks() const {
     for (const Arrays *arrays : {&inputs_, &outputs_})
         for (const auto &[number, array] : *arrays) {
             const std::vector<int32_t> sizes = array->sizes();
-            if (std::any_of(sizes.begin(), sizes.end(), [](int32_t size) { return size < 0; }) ||
+            const bool isNegative =
+                std::any_of(sizes.begin(), sizes.end(), [](int32_t size) { return size < 0; });
+            if ((isNegative && !array->isUnchanged()) ||
                 (!array->isRecords && array->blockSize() > array->room()))
                 return false;
         }
@@ -263,7 +265,10 @@ uint64_t Call::outputHash(ErrorCode status) const {
             if (array->role == Role::Input || !array->isCounted)
                 continue;
             const std::size_t header = array->headerSize();
-            hash.add(array->block(), header);
+            std::vector<int32_t> sizes = array->sizes();
+            for (int32_t &size : sizes)
+                size = std::max(size, 0);
+            hash.add(sizes.data(), header);
             AddBytes(hash, array->block() + header, array->blockSize() - header);
         }
     for (const auto &[number, value] : scalars_)

@@ -239,6 +239,7 @@ public:
     // Two arrays of that content in its stead, of which the second one counts.
     void keepApart(const Pair &pair) { shared_ = pair, sharing_ = Sharing::TwoArrays; }
     bool sharesArray() const { return sharing_ == Sharing::OneArray; }
+    // But for a negative size that is claimed and still there.
     bool sizesFitBlocks() const;
     bool inputsAreUnchanged() const;
     // After a failure: arrays without elements, scalars NaN or 0, kept arrays as they were.
@@ -293,9 +294,8 @@ private:
     int32_t sizeOf(int number, int dimension, int32_t asked) const;
     static Meeting meetingOf(const Array &first, const Array &second);
     Array &add(Role role, const Place &place, std::unique_ptr<Array> array);
-    template <class Made, class FillIn>
-    Made &addOrShare(Role role, const Place &place, std::unique_ptr<Made> array,
-                     const FillIn &fillIn);
+    template <class Made>
+    Made &addOrShare(Role role, const Place &place, std::unique_ptr<Made> array);
     template <class Made, class... Sizes>
     Made &addOutput(int number, Sizes... sizes);
     std::unique_ptr<Array> *find(const Place &place);

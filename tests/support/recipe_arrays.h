@@ -61,6 +61,18 @@ void Fill(T *elements, int32_t count, int32_t cols, int seed, const Values &valu
 
 } // namespace detail
 
+// While one exists, resizes are the test's: the host neither refuses nor records them.
+class TestsOwnResizes {
+public:
+    TestsOwnResizes() : record_(Host()) { ResetHost(); }
+    ~TestsOwnResizes() { Host() = std::move(record_); }
+    TestsOwnResizes(const TestsOwnResizes &) = delete;
+    TestsOwnResizes &operator=(const TestsOwnResizes &) = delete;
+
+private:
+    HostRecord record_;
+};
+
 template <ElementType Code>
 struct Call::Array1 : Call::Array {
     explicit Array1(int32_t count) : array(count) {}
@@ -75,6 +87,11 @@ struct Call::Array1 : Call::Array {
     }
     std::vector<int32_t> sizes() const override { return {array.size()}; }
     ElementType element() const override { return Code; }
+    void take(const Array1 &other) {
+        const TestsOwnResizes own;
+        array.resize(other.array.size());
+        std::copy_n(other.array.data(), other.array.size(), array.data());
+    }
 };
 
 template <ElementType Code>
@@ -92,19 +109,22 @@ struct Call::Array2 : Call::Array {
     }
     std::vector<int32_t> sizes() const override { return {array.rows(), array.cols()}; }
     ElementType element() const override { return Code; }
+    void take(const Array2 &other) {
+        const TestsOwnResizes own;
+        array.resize(other.array.rows(), other.array.cols());
+        std::copy_n(other.array.data(), other.array.size(), array.data());
+    }
 };
 
-// Adds an array, or lets it be one with its partner that stands already. fillIn(array) sizes it and
-// writes what is read of it.
-template <class Made, class FillIn>
-Made &Call::addOrShare(Role role, const Place &place, std::unique_ptr<Made> made,
-                       const FillIn &fillIn) {
+// Adds an array, or lets it be one with its partner that stands already, which gets its content.
+template <class Made>
+Made &Call::addOrShare(Role role, const Place &place, std::unique_ptr<Made> made) {
     std::unique_ptr<Array> *const held = partnerOf(place);
     if (held == nullptr)
         return static_cast<Made &>(add(role, place, std::move(made)));
     auto &partner = dynamic_cast<Made &>(**held);
     if (role != Role::Output) {
-        fillIn(partner);
+        partner.take(*made);
         partner.remember();
     }
     made->role = role;
@@ -124,8 +144,7 @@ Made &Call::addOrShare(Role role, const Place &place, std::unique_ptr<Made> made
 
 template <class Made, class... Sizes>
 Made &Call::addOutput(int number, Sizes... sizes) {
-    return addOrShare(Role::Output, {true, number}, std::make_unique<Made>(sizes...),
-                      [](Made &) {});
+    return addOrShare(Role::Output, {true, number}, std::make_unique<Made>(sizes...));
 }
 
 template <class Made>
@@ -138,15 +157,10 @@ template <ElementType Code, class Values>
 Handle1D<Code> Call::make(Role role, int number, int32_t count, const Values &values) {
     const HeapProbe::Pause pause;
     const int32_t size = sizeOf(number, 0, count);
-    const auto fillIn = [&](Array1<Code> &made) {
-        if (made.array.size() != size)
-            made.array.resize(size);
-        detail::Fill(made.array.data(), size, 1, number, values);
-        spoilIfAsked(made, 1, size);
-    };
-    auto array = std::make_unique<Array1<Code>>(size);
-    fillIn(*array);
-    return addOrShare(role, {false, number}, std::move(array), fillIn).array.handle();
+    auto made = std::make_unique<Array1<Code>>(size);
+    detail::Fill(made->array.data(), size, 1, number, values);
+    spoilIfAsked(*made, 1, size);
+    return addOrShare(role, {false, number}, std::move(made)).array.handle();
 }
 
 template <ElementType Code, class Values>
@@ -154,15 +168,10 @@ Handle2D<Code> Call::make(Role role, int number, int32_t rows, int32_t cols, con
     const HeapProbe::Pause pause;
     const int32_t first = sizeOf(number, 0, rows);
     const int32_t second = sizeOf(number, 1, cols);
-    const auto fillIn = [&](Array2<Code> &made) {
-        if (made.array.rows() != first || made.array.cols() != second)
-            made.array.resize(first, second);
-        detail::Fill(made.array.data(), made.array.size(), second, number, values);
-        spoilIfAsked(made, first, second);
-    };
-    auto array = std::make_unique<Array2<Code>>(first, second);
-    fillIn(*array);
-    return addOrShare(role, {false, number}, std::move(array), fillIn).array.handle();
+    auto made = std::make_unique<Array2<Code>>(first, second);
+    detail::Fill(made->array.data(), made->array.size(), second, number, values);
+    spoilIfAsked(*made, first, second);
+    return addOrShare(role, {false, number}, std::move(made)).array.handle();
 }
 
 template <ElementType Code>
