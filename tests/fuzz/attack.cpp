@@ -158,7 +158,8 @@ void CheckRefusal(ErrorCode status, bool hasStatus) {
         Tell("one array for two outputs is not refused (%d)", status);
 }
 
-void CheckRepetition(const char *name, const Outcome &first, const Outcome &second, bool shares) {
+void CheckRepetition(const char *name, const Outcome &first, const Outcome &second,
+                     const char *apart) {
     if (IsKept(name, Oddity::OldContentStays) || IsKept(name, Oddity::DependsOnState))
         return;
     // The others may have filled the region, or switched it off, in between.
@@ -166,9 +167,7 @@ void CheckRepetition(const char *name, const Outcome &first, const Outcome &seco
     if (options.threads > 1 && lacksMemory)
         return;
     if (first.hash != second.hash || first.status != second.status)
-        Tell(shares ? "one handle twice gives another result (%d, apart %d)"
-                    : "the same call gives another result (%d, %d)",
-             first.status, second.status);
+        Tell("%s gives another result (%d, %d)", apart, first.status, second.status);
 }
 
 TinyWorkspace::TinyWorkspace(uint32_t size) : size_(size) {

@@ -76,8 +76,9 @@ void CheckStatus(const char *name, ErrorCode status, const Disturbance &disturba
 void CheckHost();
 // Tells where an array that the call writes in two places is not refused.
 void CheckRefusal(ErrorCode status, bool hasStatus);
-// The same call, made twice, has to have the same outcome.
-void CheckRepetition(const char *name, const Outcome &first, const Outcome &second, bool shares);
+// A call and the one that `apart` names have to have the same outcome.
+void CheckRepetition(const char *name, const Outcome &first, const Outcome &second,
+                     const char *apart);
 
 // The workspace for one call in one thread.
 class TinyWorkspace {

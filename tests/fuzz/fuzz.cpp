@@ -89,7 +89,10 @@ void RunThunkCase(const Thunk &thunk, Random &random, Tally &tally) {
             continue;
         const Outcome second = CallAlone(scenario, {shares, 0xC2, says});
         if (!says || !IsCodeOfNegativeSize(thunk.name, outcome.status))
-            CheckRepetition(thunk.name, outcome, second, shares);
+            CheckRepetition(thunk.name, outcome, second,
+                            says     ? "an empty array for a negative size"
+                            : shares ? "an array for each handle"
+                                     : "the same call");
     }
 }
 

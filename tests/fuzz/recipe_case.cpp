@@ -159,7 +159,10 @@ Outcome RunRecipeCase(Random &random, const Recipe &recipe) {
         return outcome;
     const Outcome second = RunOnce(recipe, spoiling, 0xC2, Made::Otherwise);
     if (spoiling.claimed == 0 || !IsCodeOfNegativeSize(name.c_str(), outcome.status))
-        CheckRepetition(name.c_str(), outcome, second, spoiling.shared.has_value());
+        CheckRepetition(name.c_str(), outcome, second,
+                        spoiling.claimed < 0 ? "an empty array for a negative size"
+                        : spoiling.shared    ? "an array for each handle"
+                                             : "the same call");
     return outcome;
 }
 
