@@ -105,8 +105,8 @@ void MakeKnots(const DBL *x, int32_t n, int32_t degree, int32_t interior, const 
         }
         const double position = (i + 1.0) * (n - 1.0) / (interior + 1.0);
         const auto below = std::min(static_cast<int32_t>(position), n - 2);
-        const double share = position - below;
-        inner[i] = std::min(x[below] + share * (x[below + 1] - x[below]), x[below + 1]);
+        const double share = position - below, low = x[below], high = x[below + 1];
+        inner[i] = std::min(low + share * (high - low), high);
     }
     Fill(inner + interior, degree + 1, x[n - 1]);
 }

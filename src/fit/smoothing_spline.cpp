@@ -1,5 +1,6 @@
 #include "fit/smoothing_spline.h"
 
+#include "fit/weights.h"
 #include "frame/constants.h"
 
 #include <algorithm>
@@ -88,13 +89,6 @@ double LastNotAbove(const Function &f, double low, double atLow, double high, do
     }
 }
 
-double Largest(const DBL *x, int32_t n) {
-    double largest = x[0];
-    for (int32_t i = 1; i < n; ++i)
-        largest = std::max<double>(largest, x[i]);
-    return largest;
-}
-
 } // namespace
 
 ErrorCode SmoothingSpline::make(const DBL *x, const DBL *y, const DBL *d, int32_t n) {
@@ -103,7 +97,7 @@ ErrorCode SmoothingSpline::make(const DBL *x, const DBL *y, const DBL *d, int32_
     d_ = d;
     n_ = n;
     unitOfX_ = (x[n - 1] - x[0]) / (n - 1);
-    unitOfD_ = d == nullptr ? 1.0 : Largest(d, n);
+    unitOfD_ = d == nullptr ? 1.0 : LargestWeight(d, n);
     if (const ErrorCode failed = memory_.take(Sized(rest_, n), Sized(steps_, int64_t{n} - 1)))
         return failed;
     takeOffLine();
