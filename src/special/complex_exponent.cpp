@@ -78,19 +78,18 @@ ExtendedComplex ExtendedRoot(ExtendedComplex z) { // one step of Newton's
     return {ExactSum(root.re, step.re), ExactSum(root.im, step.im)};
 }
 
-DebyeExponent ExponentOfDebye(double order, Complex z) {
+DebyeExponent ExponentOfDebye(Extended order, Complex z) {
     // order^2 + z^2 = x^2 - (y + order) (y - order) + 2 i x y
     const Extended squareX = ExactProduct(z.re, z.re);
-    const Extended crossed = ExactSum(z.im, order) * ExactSum(z.im, -order);
-    const ExtendedComplex s = ExtendedRoot({squareX - crossed, Twice(ExactProduct(z.re, z.im))});
-    const Extended v = {order, 0};
     const Extended x = {z.re, 0};
     const Extended y = {z.im, 0};
-    const ExtendedComplex a = {v + s.re, s.im};
+    const Extended crossed = (y + order) * (y - order);
+    const ExtendedComplex s = ExtendedRoot({squareX - crossed, Twice(ExactProduct(z.re, z.im))});
+    const ExtendedComplex a = {order + s.re, s.im};
     const Extended logarithm =
         LogOfQuotient(a.re * a.re + a.im * a.im, squareX + ExactProduct(z.im, z.im));
     const Extended angle = ExtendedArgument(a.re * x + a.im * y, a.im * x - a.re * y);
-    return {{s.re.high, s.im.high}, {s.re - v * Half(logarithm), s.im - v * angle}};
+    return {{s.re.high, s.im.high}, {s.re - order * Half(logarithm), s.im - order * angle}};
 }
 
 Complex Value(const Exponential &term, const ExtendedComplex &scale) {

@@ -34,7 +34,7 @@ struct DebyeExponent {
     Complex s;
     ExtendedComplex exponent;
 };
-DebyeExponent ExponentOfDebye(double order, Complex z);
+DebyeExponent ExponentOfDebye(Extended order, Complex z);
 
 // The argument of re + i im, from -pi to pi; absolute error about 2^-70.
 Extended ExtendedArgument(Extended re, Extended im);

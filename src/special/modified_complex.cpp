@@ -2,6 +2,7 @@
 
 #include "frame/constants.h"
 #include "special/extended.h"
+#include "special/order_recurrence.h"
 #include "special/rational.h"
 #include "special/reciprocal_gamma.h"
 #include "special/tables/bessel_complex.h"
@@ -45,6 +46,7 @@ Complex Difference(const ExtendedComplex &a, const ExtendedComplex &b) {
     return {(a.re - b.re).high, (a.im - b.im).high};
 }
 Complex Exp(Complex z) { return Value({kOne, Plain(z)}, Plain({0, 0})); }
+Complex TimesI(Complex z) { return {-z.im, z.re}; }
 Complex TurnByPi(double turns) { return {CosPi(turns), SinPi(turns)}; } // exp(i pi turns)
 Exponential Conjugate(const Exponential &term) {
     const Extended im = term.exponent.im;
@@ -111,10 +113,10 @@ Sums HankelSums(double order, Complex z) {
     return sums;
 }
 
-Exponential DebyeK(double order, Complex z) {
+Exponential DebyeK(Extended order, Complex z) {
     const DebyeExponent place = ExponentOfDebye(order, z);
     const Complex scale = Inverse(RootOfUpperHalf(place.s)) * kRootHalfPi;
-    return {scale * DebyeSums(order, place.s).alternating, Negative(place.exponent)};
+    return {scale * DebyeSums(order.high, place.s).alternating, Negative(place.exponent)};
 }
 
 // exp(e) S(u) + i exp(i pi order) exp(-e) S(-u), over sqrt(2 pi s).
@@ -123,15 +125,15 @@ ExponentialPair TwoExponentials(double order, Complex s, const ExtendedComplex &
     const Complex scale = Inverse(RootOfUpperHalf(s)) * kInverseRootTwoPi;
     ExponentialPair pair = {{scale * growing, exponent}, {{0, 0}, exponent}};
     if (hasSecond)
-        pair.second = {scale * decaying * TurnByPi(order + 0.5), Negative(exponent)};
+        pair.second = {scale * decaying * TimesI(TurnByPi(order)), Negative(exponent)};
     return pair;
 }
 
-ExponentialPair DebyeI(double order, Complex z) {
+ExponentialPair DebyeI(Extended order, Complex z) {
     const DebyeExponent place = ExponentOfDebye(order, z);
-    const Sums sums = DebyeSums(order, place.s);
-    const bool isBeyondStokesLine = z.im > order && place.exponent.im.high > kHalfPi * order;
-    return TwoExponentials(order, place.s, place.exponent, sums.plain, sums.alternating,
+    const Sums sums = DebyeSums(order.high, place.s);
+    const bool isBeyondStokesLine = z.im > order.high && place.exponent.im.high > kHalfPi * order.high;
+    return TwoExponentials(order.high, place.s, place.exponent, sums.plain, sums.alternating,
                            isBeyondStokesLine && place.exponent.re.high < 20);
 }
 
@@ -296,15 +298,14 @@ TwoOrders SeriesK(double mu, Complex z, double modulus) {
 
 // K_(order + steps) from K_order and K_(order + 1).
 Exponential Upwards(double order, int steps, Complex z, const TwoOrders &start) {
-    const Complex step = Complex{2, 0} / z; // z may be tiny
-    Complex lower = start.first;
-    Complex upper = start.second;
-    for (int k = 1; k <= steps; ++k) {
-        const Complex next = lower + step * upper * (order + k);
-        lower = upper;
-        upper = next;
-    }
-    return {lower, start.exponent};
+    if (steps <= 1)
+        return {steps == 0 ? start.first : start.second, start.exponent};
+    // Scaled, since a step takes no numbers next to the end of the range.
+    constexpr double down = 0x1p-60;
+    OrderRecurrence k(z, ExactSum(order, 1), 1, start.first * down, start.second * down);
+    for (int n = 1; n < steps; ++n)
+        k.advance();
+    return {k.value() * (1 / down), start.exponent};
 }
 
 // The value of a pair over exp(exponent).
@@ -325,18 +326,13 @@ Exponential TurningI(double order, Complex z, double modulus) {
     const double width = TurningWidth(0, modulus + TurningWidth(0, modulus) + 2);
     const double wide = std::sqrt(width * width - z.re * z.re);
     const int steps = std::max(1, static_cast<int>(std::ceil(z.im + wide - order)));
-    const ExponentialPair highest = DebyeI(order + steps + 1, z);
-    const ExponentialPair high = DebyeI(order + steps, z);
+    const ExponentialPair highest = DebyeI(ExactSum(order, steps + 1), z);
+    const ExponentialPair high = DebyeI(ExactSum(order, steps), z);
     const ExtendedComplex exponent = high.first.exponent;
-    const Complex step = Inverse(z) * 2;
-    Complex above = Over(exponent, highest);
-    Complex p = Over(exponent, high);
-    for (int k = steps; k >= 1; --k) {
-        const Complex below = above + step * p * (order + k);
-        above = p;
-        p = below;
-    }
-    return {p, exponent};
+    OrderRecurrence i(z, ExactSum(order, steps), -1, Over(exponent, highest), Over(exponent, high));
+    for (int k = steps; k >= 1; --k)
+        i.advance();
+    return {i.value(), exponent};
 }
 
 // Next to the turning point: up from an order below it, or from next to 0.
@@ -346,7 +342,7 @@ Exponential TurningK(double order, Complex z, double modulus) {
     const int steps = static_cast<int>(std::ceil(order - (z.im - wide))) + 1;
     const double low = order - steps;
     if (low * low >= modulus && low > 0)
-        return Upwards(low, steps, z, Joined(DebyeK(low, z), DebyeK(low + 1, z)));
+        return Upwards(low, steps, z, Joined(DebyeK({low, 0}, z), DebyeK(ExactSum(low, 1), z)));
     const SplitOrder split(order);
     return Upwards(split.mu, split.m, z,
                    Joined(HankelK(std::fabs(split.mu), z), HankelK(split.mu + 1, z)));
@@ -359,7 +355,7 @@ Exponential UpperK(double order, Complex z);
 ExponentialPair AxisI(double order, Complex z) {
     const Exponential mirrored = Conjugate(UpperK(order, {-z.re, z.im}));
     const Exponential same = UpperK(order, z);
-    const Complex turn = TurnByPi(order + 0.5);
+    const Complex turn = TimesI(TurnByPi(order));
     return {{mirrored.factor * Complex{0, -kInversePi}, mirrored.exponent},
             {same.factor * turn * kInversePi, same.exponent}};
 }
@@ -372,7 +368,7 @@ ExponentialPair UpperI(double order, Complex z) {
     if (modulus >= kFar && order * order <= 2 * modulus)
         return HankelI(order, z);
     if (DebyeHolds(order, modulus, z))
-        return DebyeI(order, z);
+        return DebyeI({order, 0}, z);
     if (z.re <= kAxisWidth && z.im > order && modulus > kAxisFrom)
         return AxisI(order, z);
     if (modulus < kFar)
@@ -387,7 +383,7 @@ Exponential UpperK(double order, Complex z) {
     if (order >= kDebyeFrom && modulus < 1e-60)
         return {{kInfinity, 0}, Plain({0, 0})};
     if (DebyeHolds(order, modulus, z))
-        return DebyeK(order, z);
+        return DebyeK({order, 0}, z);
     if (modulus >= kFar)
         return TurningK(order, z, modulus);
     const SplitOrder split(order);
