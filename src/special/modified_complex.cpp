@@ -194,6 +194,13 @@ struct SplitOrder {
         : mu(order - std::floor(order + 0.5)), m(static_cast<int>(std::floor(order + 0.5))) {}
 };
 
+// z inverse - 1 in more digits than those of the product.
+Complex ExcessOfInverse(Complex z, Complex inverse) {
+    const Extended re = ExactProduct(z.re, inverse.re) - ExactProduct(z.im, inverse.im);
+    const Extended im = ExactProduct(z.re, inverse.im) + ExactProduct(z.im, inverse.re);
+    return {(re - Extended{1, 0}).high, im.high};
+}
+
 // I_(mu + k) downwards from any start, normalised by
 // (z/2)^mu exp(z) = gamma(1 + mu) (I_mu + sum 2 (mu + k) (2 mu + 1)_(k-1) / k! I_(mu + k)).
 Exponential MillerI(double order, Complex z, double modulus) {
@@ -206,20 +213,31 @@ Exponential MillerI(double order, Complex z, double modulus) {
     Complex p = kOne;
     Complex sum = p; // of the terms from k on, over the weight of k
     Complex wanted = p;
+    Complex ratio = {0, 0};
     for (int k = start; k >= 1; --k) {
-        const Complex below = above + step * p * (mu + k);
+        const double rounded = mu + k;
+        const double rest = mu - (rounded - k);
+        const Complex turned = step * p;
+        const Complex below = above + turned * rest + turned * rounded;
         above = p;
         p = below;
         const double weight = k == 1 ? 2 * (mu + 1)
                                      : (mu + k) * (2 * mu + (k - 1)) /
                                            ((mu + (k - 1)) * k); // of k over that of k - 1
         sum = p + sum * weight;
-        if (k - 1 == split.m)
+        if (k - 1 == split.m) {
             wanted = p;
+            ratio = above;
+        }
     }
     const Complex half = z * 0.5;
     const Complex power = Exp(Complex{std::log(0.5 * modulus), std::atan2(half.im, half.re)} * mu);
-    return {wanted * Inverse(sum) * power * ReciprocalGammaNextToOne(mu), Plain(z)};
+    // The sum is that of a z next to z, whose power and exponential are not those of z.
+    const Complex excess = ExcessOfInverse(z, step * 0.5); // z next to z is z (1 - excess)
+    const Complex slope = z * (ratio * Inverse(wanted) - kOne) + split.m; // of the logarithm, times z
+    const Complex correction = excess * slope;
+    return {(wanted + wanted * correction) * Inverse(sum) * power * ReciprocalGammaNextToOne(mu),
+            Plain(z)};
 }
 
 // K_mu and K_(mu+1).
