@@ -18,7 +18,6 @@ constexpr double kAxisFrom = 1;
 constexpr ExtendedComplex kNone = {{0, 0}, {0, 0}};
 
 Complex Conjugate(Complex z) { return {z.re, -z.im}; }
-Complex TurnByPi(double turns) { return {CosPi(turns), SinPi(turns)}; } // exp(i pi turns)
 Complex TimesI(Complex z) { return {-z.im, z.re}; }
 
 // The values of exp(scale) times a function at z in the upper half-plane, the real axis included.

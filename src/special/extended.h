@@ -1,6 +1,7 @@
 #ifndef QX_SPECIAL_EXTENDED_H
 #define QX_SPECIAL_EXTENDED_H
 
+#include "frame/complex.h"
 #include "frame/constants.h"
 #include "frame/extended.h"
 
@@ -32,6 +33,20 @@ inline double CosPi(double x) {
     if (r <= 0.75)
         return r == 0.5 ? 0.0 : std::sin(kPi * (0.5 - r));
     return -std::cos(kPi * (1 - r));
+}
+
+// exp(i pi turns), exact zeros and ones included; |turns| to 2^52.
+inline CDB TurnByPi(double turns) {
+    const double x = turns - 2 * std::floor(0.5 * turns + 0.5); // -1 to 1
+    const double quarters = std::floor(2 * x + 0.5);
+    const double rest = x - 0.5 * quarters;
+    const double sine = rest == 0 ? 0 : std::sin(kPi * rest);
+    const double cosine = rest == 0 ? 1 : std::cos(kPi * rest);
+    if (quarters == 0)
+        return {cosine, sine};
+    if (quarters == 1)
+        return {-sine, cosine};
+    return quarters == -1 ? CDB{sine, -cosine} : CDB{-cosine, -sine};
 }
 
 inline bool IsInteger(double x) { return std::floor(x) == x && !std::isinf(x); }

@@ -25,15 +25,19 @@ constexpr double kRootHalfPi = 0x1.40d931ff62706p+0;
 constexpr Complex kOne = {1, 0};
 
 constexpr int kSteps = 160;
-struct Inverses {
+struct Inverses { // 1 / n
     double of[kSteps + 1] = {};
     constexpr Inverses() {
         for (int n = 1; n <= kSteps; ++n)
             of[n] = 1.0 / n;
     }
 };
-constexpr Inverses inverse;
+constexpr Inverses inverses;
 
+// The argument of a z in the first quadrant.
+double Angle(Complex z) {
+    return z.im <= z.re ? std::atan(z.im / z.re) : kHalfPi - std::atan(z.re / z.im);
+}
 double Modulus(Complex z) { return std::hypot(z.re, z.im); }
 double Size(Complex z) { return std::fabs(z.re) + std::fabs(z.im); }
 Complex Conjugate(Complex z) { return {z.re, -z.im}; }
@@ -47,7 +51,6 @@ Complex Difference(const ExtendedComplex &a, const ExtendedComplex &b) {
 }
 Complex Exp(Complex z) { return Value({kOne, Plain(z)}, Plain({0, 0})); }
 Complex TimesI(Complex z) { return {-z.im, z.re}; }
-Complex TurnByPi(double turns) { return {CosPi(turns), SinPi(turns)}; } // exp(i pi turns)
 Exponential Conjugate(const Exponential &term) {
     const Extended im = term.exponent.im;
     return {Conjugate(term.factor), {term.exponent.re, -im}};
@@ -104,7 +107,7 @@ Sums HankelSums(double order, Complex z) {
     Complex term = kOne;
     for (int k = 1; k < 48; ++k) {
         const double odd = 2 * k - 1;
-        term = term * step * ((square - odd * odd) * inverse.of[k]);
+        term = term * step * ((square - odd * odd) * inverses.of[k]);
         sums.plain += term;
         sums.alternating = k % 2 == 0 ? sums.alternating + term : sums.alternating - term;
         if (Size(term) < kNegligible)
@@ -165,23 +168,33 @@ double RoundingInPower(double order, Complex z, double modulus) {
     return rest;
 }
 
+// sum q^k / (k! (order + 1)_k) for |q| <= order + 1, nested: 1 + q / (order + 1) (1 + ...).
+Complex NestedSeries(double order, Complex q) {
+    constexpr int most = 24;
+    double weights[most];
+    const double size = Size(q);
+    double term = 1;
+    int n = 0;
+    while (n < most && term > kNegligible) {
+        weights[n] = inverses.of[n + 1] / (order + (n + 1));
+        term *= size * weights[n];
+        ++n;
+    }
+    Complex sum = kOne;
+    while (--n >= 0)
+        sum = kOne + q * weights[n] * sum;
+    return sum;
+}
+
 // (z/2)^order / gamma(order + 1) sum (z^2/4)^k / (k! (order + 1)_k)
 Exponential SeriesI(double order, Complex z, double modulus) {
     const Complex half = z * 0.5;
-    const Complex square = half * half;
-    Complex term = kOne;
-    Complex sum = kOne;
-    for (int k = 1; k < 60; ++k) {
-        term = term * square / (k * (order + k));
-        sum += term;
-        if (Size(term) < kNegligible * Size(sum))
-            break;
-    }
+    const Complex sum = NestedSeries(order, half * half);
     if (order == 0)
         return {sum, Plain({0, 0})};
     const double size = PowerOverGamma(0.5 * modulus, order);
     if (order < 4)
-        return {sum * size, Plain({0, order * std::atan2(z.im, z.re)})};
+        return {sum * size, Plain({0, order * Angle(z)})};
     const Extended angle = ExtendedArgument({z.re, 0}, {z.im, 0}) * Extended{order, 0};
     return {sum * size, {{0, RoundingInPower(order, z, modulus)}, angle}};
 }
@@ -195,9 +208,9 @@ struct SplitOrder {
 };
 
 // z inverse - 1 in more digits than those of the product.
-Complex ExcessOfInverse(Complex z, Complex inverse) {
-    const Extended re = ExactProduct(z.re, inverse.re) - ExactProduct(z.im, inverse.im);
-    const Extended im = ExactProduct(z.re, inverse.im) + ExactProduct(z.im, inverse.re);
+Complex ExcessOfInverse(Complex z, Complex found) {
+    const Extended re = ExactProduct(z.re, found.re) - ExactProduct(z.im, found.im);
+    const Extended im = ExactProduct(z.re, found.im) + ExactProduct(z.im, found.re);
     return {(re - Extended{1, 0}).high, im.high};
 }
 
@@ -231,7 +244,7 @@ Exponential MillerI(double order, Complex z, double modulus) {
         }
     }
     const Complex half = z * 0.5;
-    const Complex power = Exp(Complex{std::log(0.5 * modulus), std::atan2(half.im, half.re)} * mu);
+    const Complex power = Exp(Complex{std::log(0.5 * modulus), Angle(z)} * mu);
     // The sum is that of a z next to z, whose power and exponential are not those of z.
     const Complex excess = ExcessOfInverse(z, step * 0.5); // z next to z is z (1 - excess)
     const Complex slope = z * (ratio * Inverse(wanted) - kOne) + split.m; // of the logarithm, times z
@@ -256,62 +269,113 @@ TwoOrders MillerK(double mu, Complex z, double modulus) {
     Complex u = kOne;
     Complex sum = u; // of C_m U_m from m = n on, over C_n / n!
     for (int n = start; n >= 1; --n) {
-        const Complex below = (z + n) * u * (2 * inverse.of[n]) -
-                              above * (coefficient(n + 1) * (inverse.of[n] * inverse.of[n + 1]));
+        const Complex below = (z + n) * u * (2 * inverses.of[n]) -
+                              above * (coefficient(n + 1) * (inverses.of[n] * inverses.of[n + 1]));
         above = u;
         u = below;
-        sum = u + sum * (coefficient(n) * (inverse.of[n] * inverse.of[n]));
+        sum = u + sum * (coefficient(n) * (inverses.of[n] * inverses.of[n]));
     }
     const Complex first = Inverse(RootOfUpperHalf(z)) * kRootHalfPi * u * Inverse(sum);
     const Complex ratio = (z + (mu + 0.5) - above * Inverse(u) * coefficient(1)) * Inverse(z);
     return {first, first * ratio, Plain(-z)};
 }
 
-// The two series of Temme about z = 0.
-TwoOrders SeriesK(double mu, Complex z, double modulus) {
+// K_(-1/2) = K_(1/2) = sqrt(pi / (2 z)) exp(-z).
+TwoOrders HalfOrderK(Complex z) {
+    const Complex value = Complex{kRootHalfPi, 0} / RootOfUpperHalf(z);
+    return {value, value, Plain(-z)};
+}
+
+// (z/2)^-mu and its inverse, and sinh(s) / s of the exponent s.
+struct PowersOfHalf {
+    Complex grow, decay, sinc, logarithm; // the latter of 2 / z
+    PowersOfHalf(double mu, Complex z, double modulus) {
+        int exponent;
+        const double mantissa = std::frexp(0.5 * modulus, &exponent);
+        // For a small |z| the rounding of the logarithm would be one of the power.
+        const double part = std::log(mantissa);
+        const Extended turns = {static_cast<double>(-exponent), 0};
+        const Extended logOfSize = turns * table::extendedLnTwo + Extended{-part, 0};
+        const double angle = Angle(z);
+        logarithm = {logOfSize.high, -angle};
+        grow = decay = sinc = kOne;
+        if (mu == 0)
+            return;
+        const Extended s = logOfSize * Extended{mu, 0};
+        const Complex turn = {std::cos(mu * angle), -std::sin(mu * angle)};
+        const double size = std::exp(s.high) * (1 + s.low);
+        grow = turn * size;
+        decay = Conjugate(turn) * (1 / size);
+        const Complex sigma = {s.high, -mu * angle};
+        const double sigmaSize = Size(sigma);
+        if (sigmaSize > 0.5) {
+            sinc = (grow - decay) * 0.5 / sigma;
+        } else if (sigmaSize > 1e-9) {
+            const Complex w = sigma * sigma;
+            for (int k = 7; k >= 1; --k)
+                sinc = kOne + w * sinc * (0.5 * inverses.of[k] * inverses.of[2 * k + 1]);
+        }
+    }
+};
+
+// The two series of Temme about z = 0, sum q^k / k! f_k and sum q^k / k! (p_k - k f_k) with
+// f_k = (k f_(k-1) + p_(k-1) + q_(k-1)) / (k^2 - mu^2), each a sum of three power series with real
+// coefficients times what depends on the power of z.
+TwoOrders SeriesK(double mu, Complex z, double modulus, bool hasSecond) {
     double even = 0; // (1 / gamma(1 - mu) + 1 / gamma(1 + mu)) / 2
     double odd = 0;  // (1 / gamma(1 - mu) - 1 / gamma(1 + mu)) / (2 mu)
     for (int k = static_cast<int>(std::size(table::reciprocalGamma)) - 2; k >= 0; k -= 2) {
         even = even * (mu * mu) + table::reciprocalGamma[k];
         odd = odd * (mu * mu) - table::reciprocalGamma[k + 1];
     }
+    const PowersOfHalf power(mu, z, modulus);
+    const double reflected = mu == 0 ? 1 : kPi * mu / SinPi(mu);
+    const Complex f =
+        ((power.grow + power.decay) * (0.5 * odd) + power.sinc * power.logarithm * even) *
+        reflected;
+    // gamma(1 + mu) / 2 and gamma(1 - mu) / 2
+    const Complex p = power.grow * (0.5 / (even - mu * odd));
+    const Complex q = power.decay * (0.5 / (even + mu * odd));
+
+    constexpr int most = 20;
+    double ofF[most] = {1}; // what f_k / k! has of f, p and q
+    double ofP[most] = {0};
+    double ofQ[most] = {0};
+    double pOverP[most] = {1}; // p_k / (k! p)
     const Complex half = z * 0.5;
     const Complex square = half * half;
-    const Complex logarithm = {-std::log(0.5 * modulus), -std::atan2(half.im, half.re)};
-    const Complex sigma = logarithm * mu;
-    const Complex grow = Exp(sigma); // (z/2)^-mu
-    const Complex decay = Exp(-sigma);
-    const Complex sine = (grow - decay) * 0.5;
-    const double sigmaSize = Size(sigma);
-    Complex sinc = kOne; // sinh(sigma) / sigma
-    if (sigmaSize > 0.5) {
-        sinc = sine / sigma;
-    } else if (sigmaSize > 0) {
-        const Complex w = sigma * sigma;
-        for (int k = 8; k >= 1; --k)
-            sinc = kOne + w * sinc * (1.0 / (2 * k * (2 * k + 1)));
+    const double size = Size(square);
+    double qOverQ = 1;
+    double term = 1;
+    int n = 0;
+    while (n + 1 < most && term > kNegligible) {
+        ++n;
+        const double scale = 1 / ((n - mu) * (n + mu)) * inverses.of[n];
+        ofF[n] = n * scale * ofF[n - 1];
+        ofP[n] = scale * (n * ofP[n - 1] + pOverP[n - 1]);
+        ofQ[n] = scale * (n * ofQ[n - 1] + qOverQ);
+        pOverP[n] = pOverP[n - 1] * ((n + mu) * scale);
+        qOverQ *= (n - mu) * scale;
+        term *= size * scale * n;
     }
-    const double reflected = mu == 0 ? 1 : kPi * mu / SinPi(mu);
-    Complex f = ((grow + decay) * (0.5 * odd) + sinc * logarithm * even) * reflected;
-    // gamma(1 + mu) / 2 and gamma(1 - mu) / 2
-    Complex p = grow * (0.5 / (even - mu * odd));
-    Complex q = decay * (0.5 / (even + mu * odd));
-    Complex c = kOne;
-    Complex first = f;
-    Complex second = p;
-    for (int k = 1; k < 40; ++k) {
-        f = (f * k + p + q) / (k * k - mu * mu);
-        p = p / (k - mu);
-        q = q / (k + mu);
-        c = c * square * inverse.of[k];
-        const Complex term = c * f;
-        const Complex other = c * (p - f * k);
-        first += term;
-        second += other;
-        if (Size(term) < kNegligible * Size(first) && Size(other) < kNegligible * Size(second))
-            break;
+    Complex sumF = {0, 0};
+    Complex sumP = {0, 0};
+    Complex sumQ = {0, 0};
+    for (int k = n; k >= 0; --k) {
+        sumF = sumF * square + ofF[k];
+        sumP = sumP * square + ofP[k];
+        sumQ = sumQ * square + ofQ[k];
     }
-    return {first, second / half, Plain({0, 0})};
+    const Complex first = f * sumF + (p * sumP + q * sumQ);
+    if (!hasSecond)
+        return {first, {0, 0}, Plain({0, 0})};
+    sumF = sumP = sumQ = {0, 0};
+    for (int k = n; k >= 0; --k) {
+        sumF = sumF * square - Complex{k * ofF[k], 0};
+        sumP = sumP * square + (pOverP[k] - k * ofP[k]);
+        sumQ = sumQ * square - Complex{k * ofQ[k], 0};
+    }
+    return {first, (f * sumF + (p * sumP + q * sumQ)) / half, Plain({0, 0})};
 }
 
 // K_(order + steps) from K_order and K_(order + 1).
@@ -405,8 +469,10 @@ Exponential UpperK(double order, Complex z) {
     if (modulus >= kFar)
         return TurningK(order, z, modulus);
     const SplitOrder split(order);
+    if (split.mu == -0.5)
+        return Upwards(split.mu, split.m, z, HalfOrderK(z));
     return Upwards(split.mu, split.m, z,
-                   modulus + z.re <= 3 ? SeriesK(split.mu, z, modulus)
+                   modulus + z.re <= 3 ? SeriesK(split.mu, z, modulus, split.m > 0)
                                        : MillerK(split.mu, z, modulus));
 }
 
