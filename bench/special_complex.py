@@ -1,51 +1,80 @@
 #!/usr/bin/python3
-"""Times of the complex Bessel and Airy functions over arrays from Python, as ratios to SciPy's in the
-same run (scaled values, 5000 random points of each region of the plane).
-
-usage: PYTHONPATH=python bench/special_complex.py
+"""Times of the complex Bessel and Airy functions over arrays from Python beside SciPy's: scaled values
+at 5000 random points of each region of the plane, in processor time of the calling thread, the best of
+interleaved rounds. SciPy's four Airy functions come from one call and are compared with all four of
+ours.
 """
 
+import sys
 import time
 import warnings
+from pathlib import Path
 
 import numpy as np
-from scipy import special
 
-import qx
+sys.path.insert(0, str(Path(__file__).resolve().parent.parent / "python"))
+import qx  # noqa: E402
+from summary import print_summary  # noqa: E402
+
+try:
+    from scipy import special
+except ImportError:
+    sys.exit(print("missing peer: python3-scipy"))
 
 COUNT = 5000
 BESSEL = (("J", special.jve), ("Y", special.yve), ("I", special.ive), ("K", special.kve),
           ("H1", special.hankel1e), ("H2", special.hankel2e))
 AIRY = ("QX_CxAiryAi", "QX_CxAiryAiP", "QX_CxAiryBi", "QX_CxAiryBiP")
+# Orders from, to, moduli from, to; the last is about the turning points, |z| within 4 |order|^(1/3)
+# of the order.
 REGIONS = ((0, 0, 0.01, 1), (0, 3, 0.1, 3), (0, 5, 2, 20), (0, 5, 25, 100), (5, 40, 10, 60),
-           (90, 300, 100, 600), (100, 500, 500, 1000))
+           (90, 300, 100, 600), (100, 500, 500, 1000), (30, 1000, None, None))
+AIRY_REGIONS = ((0.1, 1.5), (1.5, 9), (10, 100))
 
 
-def best(work):
-    times = []
-    for _ in range(9):
-        start = time.perf_counter()
-        work()
-        times.append(time.perf_counter() - start)
-    return min(times) / COUNT * 1e9
+def seconds(function):
+    start = time.thread_time()
+    function()
+    return time.thread_time() - start
+
+
+def best(ours, theirs, rounds=15):
+    times = [(seconds(ours), seconds(theirs)) for _ in range(rounds)]
+    return [min(column) / COUNT for column in zip(*times)]
+
+
+def shown(case, ours, theirs):
+    print(f"{case:44} {1e9 * ours:8.0f} ns a point   {ours / theirs:5.2f}", flush=True)
+    return ours / theirs, case
+
+
+def on_rays(random, modulus):
+    return modulus * np.exp(1j * random.uniform(-np.pi, np.pi, COUNT))
 
 
 def main():
     warnings.simplefilter("ignore")
-    r = np.random.default_rng(1)
+    random = np.random.default_rng(1)
+    ratios = []
     for low, high, near, far in REGIONS:
-        order = r.uniform(low, high, COUNT)
-        z = r.uniform(near, far, COUNT) * np.exp(1j * r.uniform(-np.pi, np.pi, COUNT))
-        row = []
+        order = random.uniform(low, high, COUNT)
+        if near is None:
+            size = order + random.uniform(-4, 4, COUNT) * np.cbrt(order)
+        else:
+            size = random.uniform(near, far, COUNT)
+        where = f"|z| {near} to {far}" if near is not None else "|z| near it"
+        z = on_rays(random, size)
         for name, peer in BESSEL:
-            ours = best(lambda: qx.call(f"QX_CxBessel{name}r", order, z, 1))
-            row.append(f"{name} {ours:.0f} ns {ours / best(lambda: peer(order, z)):.2f}")
-        print(f"order {low} to {high}, |z| {near} to {far}: " + ", ".join(row), flush=True)
-    for near, far in ((0.1, 1.5), (1.5, 9), (10, 100)):
-        z = r.uniform(near, far, COUNT) * np.exp(1j * r.uniform(-np.pi, np.pi, COUNT))
-        ours = [best(lambda: qx.call(name, z, 1)) for name in AIRY]
-        peer = best(lambda: special.airye(z))  # all four at once
-        print(f"Airy, |z| {near} to {far}: all four {sum(ours):.0f} ns, {sum(ours) / peer:.2f}")
+            times = best(lambda: qx.call(f"QX_CxBessel{name}r", order, z, 1), lambda: peer(order, z))
+            ratios.append(shown(f"{name}, order {low} to {high}, {where}", *times))
+    print_summary("complex Bessel functions, called from Python", "SciPy", ratios)
+    ratios = []
+    for near, far in AIRY_REGIONS:
+        z = on_rays(random, random.uniform(near, far, COUNT))
+        times = best(lambda: [qx.call(name, z, 1) for name in AIRY], lambda: special.airye(z))
+        ratios.append(shown(f"all four Airy functions, |z| {near} to {far}", *times))
+    print_summary("complex Airy functions, called from Python", "SciPy", ratios)
 
 
-main()
+if __name__ == "__main__":
+    main()

@@ -39,9 +39,16 @@ struct UpperPlane {
         const UpperPlane plain = {order, z, kNone};
         return Value({{plain.h1().re, 0}, kNone}, scale);
     }
-    Complex h1() const {
-        return TimesI(Value(ModifiedK(order, turned()), scale) * TurnByPi(-0.5 * order) *
-                      -kTwoOverPi);
+    Complex h1() const { return ofK(ModifiedK(order, turned()), TurnByPi(-0.5 * order)); }
+    struct JAndH1 {
+        Complex j, h1;
+    };
+    JAndH1 jAndH1() const {
+        if (isOscillatingOnAxis())
+            return {j(), h1()};
+        const ModifiedBoth both = ModifiedIAndK(order, turned());
+        const Complex turn = TurnByPi(0.5 * order);
+        return {sum(both.i, turn), ofK(both.k, Conjugate(turn))};
     }
     bool isLeft() const { return z.re < 0; }
     Complex i() const {
@@ -51,46 +58,54 @@ struct UpperPlane {
     Complex k() const {
         if (!isLeft())
             return Value(ModifiedK(order, z), scale);
-        return Value(ModifiedK(order, -z), scale) * TurnByPi(-order) -
-               TimesI(sum(ModifiedI(order, -z), {kPi, 0}));
+        const ModifiedBoth both = ModifiedIAndK(order, -z);
+        return Value(both.k, scale) * TurnByPi(-order) - TimesI(sum(both.i, {kPi, 0}));
+    }
+
+private:
+    Complex ofK(const Exponential &k, Complex turn) const {
+        return TimesI(Value(k, scale) * turn * -kTwoOverPi);
     }
 };
-
-// A factor of 0 drops a term that may be infinite.
-Complex TimesOrNone(Complex (UpperPlane::*function)() const, const UpperPlane &plane,
-                    double factor) {
-    return factor == 0 ? Complex{0, 0} : (plane.*function)() * factor;
-}
 
 Complex OfJ(const UpperPlane &plane, bool isNegative) {
     if (!isNegative)
         return plane.j();
-    // exp(-i pi order) J + i sin(pi order) H1
-    return plane.j() * TurnByPi(-plane.order) +
-           TimesI(TimesOrNone(&UpperPlane::h1, plane, SinPi(plane.order)));
+    // exp(-i pi order) J + i sin(pi order) H1; a factor of 0 drops a term that may be infinite
+    const double sine = SinPi(plane.order);
+    if (sine == 0)
+        return plane.j() * TurnByPi(-plane.order);
+    const UpperPlane::JAndH1 both = plane.jAndH1();
+    return both.j * TurnByPi(-plane.order) + TimesI(both.h1 * sine);
 }
 
 Complex OfY(const UpperPlane &plane, bool isNegative) {
     if (!isNegative && plane.isOscillatingOnAxis())
         return {plane.h1().im, 0};
+    const double cosine = isNegative ? CosPi(plane.order) : 1;
+    if (cosine == 0)
+        return TimesI(plane.j() * TurnByPi(-plane.order));
+    const UpperPlane::JAndH1 both = plane.jAndH1();
     if (!isNegative)
-        return TimesI(plane.j() - plane.h1());
+        return TimesI(both.j - both.h1);
     // i (exp(-i pi order) J - cos(pi order) H1)
-    return TimesI(plane.j() * TurnByPi(-plane.order) -
-                  TimesOrNone(&UpperPlane::h1, plane, CosPi(plane.order)));
+    return TimesI(both.j * TurnByPi(-plane.order) - both.h1 * cosine);
 }
 
 Complex OfI(const UpperPlane &plane, bool isNegative) {
     if (!isNegative)
         return plane.i();
+    // I + 2 / pi sin(pi order) K, for Re z < 0 at -z and turned
     const double sine = SinPi(plane.order);
-    if (!plane.isLeft())
-        return plane.i() + TimesOrNone(&UpperPlane::k, plane, kTwoOverPi * sine);
-    // exp(-i pi order) (I(-z) + 2 / pi sin(pi order) K(-z))
-    Complex sum = plane.sum(ModifiedI(plane.order, -plane.z), {1, 0});
-    if (sine != 0)
-        sum += Value(ModifiedK(plane.order, -plane.z), plane.scale) * (kTwoOverPi * sine);
-    return sum * TurnByPi(-plane.order);
+    const Complex place = plane.isLeft() ? -plane.z : plane.z;
+    Complex sum;
+    if (sine == 0) {
+        sum = plane.sum(ModifiedI(plane.order, place), {1, 0});
+    } else {
+        const ModifiedBoth both = ModifiedIAndK(plane.order, place);
+        sum = plane.sum(both.i, {1, 0}) + Value(both.k, plane.scale) * (kTwoOverPi * sine);
+    }
+    return plane.isLeft() ? sum * TurnByPi(-plane.order) : sum;
 }
 
 // J + i Y on the positive real axis, where both are real. Below the turning point J is far smaller
@@ -109,8 +124,13 @@ Complex OfH1(const UpperPlane &plane, bool isNegative) {
 
 Complex OfH2(const UpperPlane &plane, bool isNegative) {
     const bool isAxis = plane.z.im == 0 && plane.z.re > 0;
-    const Complex value =
-        isAxis ? Value({Conjugate(OnAxis(plane)), kNone}, plane.scale) : plane.j() * 2 - plane.h1();
+    Complex value;
+    if (isAxis) {
+        value = Value({Conjugate(OnAxis(plane)), kNone}, plane.scale);
+    } else {
+        const UpperPlane::JAndH1 both = plane.jAndH1();
+        value = both.j * 2 - both.h1;
+    }
     return isNegative ? value * TurnByPi(-plane.order) : value;
 }
 

@@ -20,6 +20,7 @@ constexpr double kDebyeFrom = 10;     // order, for smaller |z|
 constexpr double kTurningWidth = 8.2; // times max(|z|, order)^(1/3)
 constexpr double kAxisWidth = 1;      // |Re z| up to which I is taken from K on both sides
 constexpr double kAxisFrom = 5;       // |z| from which it is
+constexpr double kSeriesUpTo = 2.67;   // |z| + Re z, of Temme's series
 constexpr double kNegligible = 0x1p-56;
 constexpr double kRootHalfPi = 0x1.40d931ff62706p+0;
 constexpr Complex kOne = {1, 0};
@@ -34,10 +35,15 @@ struct Inverses { // 1 / n
 };
 constexpr Inverses inverses;
 
-// The argument of a z in the first quadrant.
-double Angle(Complex z) {
-    return z.im <= z.re ? std::atan(z.im / z.re) : kHalfPi - std::atan(z.re / z.im);
+// The argument of a z in the first quadrant; the first has the rounding of an arc tangent up to pi/4
+// alone.
+Extended LongAngle(Complex z) {
+    if (z.im <= z.re)
+        return {std::atan(z.im / z.re), 0};
+    const Extended angle = ExactSum(table::extendedHalfPi.high, -std::atan(z.re / z.im));
+    return {angle.high, angle.low + table::extendedHalfPi.low};
 }
+double Angle(Complex z) { return LongAngle(z).high; }
 double Modulus(Complex z) { return std::hypot(z.re, z.im); }
 double Size(Complex z) { return std::fabs(z.re) + std::fabs(z.im); }
 Complex Conjugate(Complex z) { return {z.re, -z.im}; }
@@ -86,7 +92,7 @@ Sums DebyeSums(double order, Complex s) {
         double upper = 0;
         double lower = c[k];
         for (int j = k - 1; j >= 1; --j) {
-            const double next = c[j] + twice * lower - square * upper;
+            const double next = (c[j] - square * upper) + twice * lower;
             upper = lower;
             lower = next;
         }
@@ -116,39 +122,52 @@ Sums HankelSums(double order, Complex z) {
     return sums;
 }
 
-Exponential DebyeK(Extended order, Complex z) {
-    const DebyeExponent place = ExponentOfDebye(order, z);
-    const Complex scale = Inverse(RootOfUpperHalf(place.s)) * kRootHalfPi;
-    return {scale * DebyeSums(order.high, place.s).alternating, Negative(place.exponent)};
-}
-
-// exp(e) S(u) + i exp(i pi order) exp(-e) S(-u), over sqrt(2 pi s).
-ExponentialPair TwoExponentials(double order, Complex s, const ExtendedComplex &exponent,
+// exp(e) S(u) + i exp(i pi order) exp(-e) S(-u), times a scale over sqrt(2 pi).
+ExponentialPair TwoExponentials(double order, Complex root, const ExtendedComplex &exponent,
                                 Complex growing, Complex decaying, bool hasSecond) {
-    const Complex scale = Inverse(RootOfUpperHalf(s)) * kInverseRootTwoPi;
+    const Complex scale = root * kInverseRootTwoPi;
     ExponentialPair pair = {{scale * growing, exponent}, {{0, 0}, exponent}};
     if (hasSecond)
         pair.second = {scale * decaying * TimesI(TurnByPi(order)), Negative(exponent)};
     return pair;
 }
 
-ExponentialPair DebyeI(Extended order, Complex z) {
-    const DebyeExponent place = ExponentOfDebye(order, z);
-    const Sums sums = DebyeSums(order.high, place.s);
-    const bool isBeyondStokesLine = z.im > order.high && place.exponent.im.high > kHalfPi * order.high;
-    return TwoExponentials(order.high, place.s, place.exponent, sums.plain, sums.alternating,
-                           isBeyondStokesLine && place.exponent.re.high < 20);
-}
+// Debye's expansion for one place.
+struct Debye {
+    double order;
+    Complex z;
+    DebyeExponent place;
+    Sums sums;
+    Complex scale;
 
-ExponentialPair HankelI(double order, Complex z) {
-    const Sums sums = HankelSums(order, z);
-    return TwoExponentials(order, z, Plain(z), sums.alternating, sums.plain, z.re < 20);
-}
+    Debye(Extended exactOrder, Complex at)
+        : order(exactOrder.high), z(at), place(ExponentOfDebye(exactOrder, z)),
+          sums(DebyeSums(order, place.s)), scale(Inverse(RootOfUpperHalf(place.s))) {}
+    ExponentialPair i() const {
+        const bool isBeyondStokesLine =
+            z.im > order && place.exponent.im.high > kHalfPi * order;
+        return TwoExponentials(order, scale, place.exponent, sums.plain, sums.alternating,
+                               isBeyondStokesLine && place.exponent.re.high < 20);
+    }
+    Exponential k() const {
+        return {scale * kRootHalfPi * sums.alternating, Negative(place.exponent)};
+    }
+};
 
-Exponential HankelK(double order, Complex z) {
-    const Complex scale = Inverse(RootOfUpperHalf(z)) * kRootHalfPi;
-    return {scale * HankelSums(order, z).plain, Plain(-z)};
-}
+// Hankel's.
+struct Hankel {
+    double order;
+    Complex z;
+    Sums sums;
+    Complex scale;
+
+    Hankel(double ofOrder, Complex at)
+        : order(ofOrder), z(at), sums(HankelSums(order, z)), scale(Inverse(RootOfUpperHalf(z))) {}
+    ExponentialPair i() const {
+        return TwoExponentials(order, scale, Plain(z), sums.alternating, sums.plain, z.re < 20);
+    }
+    Exponential k() const { return {scale * kRootHalfPi * sums.plain, Plain(-z)}; }
+};
 
 double ReciprocalGammaNextToOne(double mu) { // 1 / gamma(1 + mu), |mu| <= 1/2
     return Horner(table::reciprocalGamma, mu);
@@ -194,7 +213,7 @@ Exponential SeriesI(double order, Complex z, double modulus) {
         return {sum, Plain({0, 0})};
     const double size = PowerOverGamma(0.5 * modulus, order);
     if (order < 4)
-        return {sum * size, Plain({0, order * Angle(z)})};
+        return {sum * size, {{0, 0}, Extended{order, 0} * LongAngle(z)}};
     const Extended angle = ExtendedArgument({z.re, 0}, {z.im, 0}) * Extended{order, 0};
     return {sum * size, {{0, RoundingInPower(order, z, modulus)}, angle}};
 }
@@ -243,7 +262,6 @@ Exponential MillerI(double order, Complex z, double modulus) {
             ratio = above;
         }
     }
-    const Complex half = z * 0.5;
     const Complex power = Exp(Complex{std::log(0.5 * modulus), Angle(z)} * mu);
     // The sum is that of a z next to z, whose power and exponential are not those of z.
     const Complex excess = ExcessOfInverse(z, step * 0.5); // z next to z is z (1 - excess)
@@ -405,11 +423,12 @@ TwoOrders Joined(const Exponential &first, const Exponential &second) {
 
 // Next to the turning point: down from an order above it.
 Exponential TurningI(double order, Complex z, double modulus) {
-    const double width = TurningWidth(0, modulus + TurningWidth(0, modulus) + 2);
-    const double wide = std::sqrt(width * width - z.re * z.re);
+    // of an order above that from which we start
+    const double width = TurningWidth(0, modulus + 10 * std::cbrt(modulus) + 7);
+    const double wide = std::sqrt(std::max(0.0, width * width - z.re * z.re));
     const int steps = std::max(1, static_cast<int>(std::ceil(z.im + wide - order)));
-    const ExponentialPair highest = DebyeI(ExactSum(order, steps + 1), z);
-    const ExponentialPair high = DebyeI(ExactSum(order, steps), z);
+    const ExponentialPair highest = Debye(ExactSum(order, steps + 1), z).i();
+    const ExponentialPair high = Debye(ExactSum(order, steps), z).i();
     const ExtendedComplex exponent = high.first.exponent;
     OrderRecurrence i(z, ExactSum(order, steps), -1, Over(exponent, highest), Over(exponent, high));
     for (int k = steps; k >= 1; --k)
@@ -424,56 +443,107 @@ Exponential TurningK(double order, Complex z, double modulus) {
     const int steps = static_cast<int>(std::ceil(order - (z.im - wide))) + 1;
     const double low = order - steps;
     if (low * low >= modulus && low > 0)
-        return Upwards(low, steps, z, Joined(DebyeK({low, 0}, z), DebyeK(ExactSum(low, 1), z)));
+        return Upwards(low, steps, z, Joined(Debye({low, 0}, z).k(), Debye(ExactSum(low, 1), z).k()));
     const SplitOrder split(order);
     return Upwards(split.mu, split.m, z,
-                   Joined(HankelK(std::fabs(split.mu), z), HankelK(split.mu + 1, z)));
+                   Joined(Hankel(std::fabs(split.mu), z).k(), Hankel(split.mu + 1, z).k()));
 }
 
-Exponential UpperK(double order, Complex z);
-
-// Next to the imaginary axis, where I oscillates: by K on both sides of the axis,
-// i pi I(z) = K(z exp(-i pi)) - exp(i pi order) K(z), with no recurrence through the turning point.
-ExponentialPair AxisI(double order, Complex z) {
-    const Exponential mirrored = Conjugate(UpperK(order, {-z.re, z.im}));
-    const Exponential same = UpperK(order, z);
-    const Complex turn = TimesI(TurnByPi(order));
-    return {{mirrored.factor * Complex{0, -kInversePi}, mirrored.exponent},
-            {same.factor * turn * kInversePi, same.exponent}};
-}
-
-ExponentialPair UpperI(double order, Complex z) {
-    const double modulus = Modulus(z);
-    const ExtendedComplex none = Plain({0, 0});
-    if (0.25 * modulus * modulus <= order + 1)
-        return {SeriesI(order, z, modulus), {{0, 0}, none}};
+// Where the asymptotic expansions hold.
+enum class Region { Hankel, Debye, Other };
+Region RegionOf(double order, Complex z, double modulus) {
     if (modulus >= kFar && order * order <= 2 * modulus)
-        return HankelI(order, z);
-    if (DebyeHolds(order, modulus, z))
-        return DebyeI({order, 0}, z);
-    if (z.re <= kAxisWidth && z.im > order && modulus > kAxisFrom)
-        return AxisI(order, z);
-    if (modulus < kFar)
-        return {MillerI(order, z, modulus), {{0, 0}, none}};
-    return {TurningI(order, z, modulus), {{0, 0}, none}};
+        return Region::Hankel;
+    return DebyeHolds(order, modulus, z) ? Region::Debye : Region::Other;
 }
 
-Exponential UpperK(double order, Complex z) {
-    const double modulus = Modulus(z);
-    if (modulus >= kFar && order * order <= 2 * modulus)
-        return HankelK(order, z);
-    if (order >= kDebyeFrom && modulus < 1e-60)
-        return {{kInfinity, 0}, Plain({0, 0})};
-    if (DebyeHolds(order, modulus, z))
-        return DebyeK({order, 0}, z);
+Exponential NearK(double order, Complex z, double modulus) {
     if (modulus >= kFar)
         return TurningK(order, z, modulus);
     const SplitOrder split(order);
     if (split.mu == -0.5)
         return Upwards(split.mu, split.m, z, HalfOrderK(z));
     return Upwards(split.mu, split.m, z,
-                   modulus + z.re <= 3 ? SeriesK(split.mu, z, modulus, split.m > 0)
+                   modulus + z.re <= kSeriesUpTo ? SeriesK(split.mu, z, modulus, split.m > 0)
                                        : MillerK(split.mu, z, modulus));
+}
+
+Exponential UpperK(double order, Complex z) {
+    const double modulus = Modulus(z);
+    if (order >= kDebyeFrom && modulus < 1e-60)
+        return {{kInfinity, 0}, Plain({0, 0})};
+    switch (RegionOf(order, z, modulus)) {
+    case Region::Hankel:
+        return Hankel(order, z).k();
+    case Region::Debye:
+        return Debye({order, 0}, z).k();
+    case Region::Other:
+        break;
+    }
+    return NearK(order, z, modulus);
+}
+
+bool IsNextToAxis(double order, Complex z, double modulus) {
+    return z.re <= kAxisWidth && z.im > order && modulus > kAxisFrom;
+}
+
+// Next to the imaginary axis, where I oscillates: by K on both sides of the axis,
+// i pi I(z) = K(z exp(-i pi)) - exp(i pi order) K(z), with no recurrence through the turning point.
+ExponentialPair AxisI(double order, Complex z, const Exponential &k) {
+    const Exponential mirrored = Conjugate(UpperK(order, {-z.re, z.im}));
+    const Complex turn = TimesI(TurnByPi(order));
+    return {{mirrored.factor * Complex{0, -kInversePi}, mirrored.exponent},
+            {k.factor * turn * kInversePi, k.exponent}};
+}
+
+bool SeriesHolds(double order, double modulus) { return 0.25 * modulus * modulus <= order + 1; }
+
+// Where no asymptotic expansion holds.
+Exponential NearI(double order, Complex z, double modulus) {
+    if (SeriesHolds(order, modulus))
+        return SeriesI(order, z, modulus);
+    return modulus < kFar && order < kDebyeFrom ? MillerI(order, z, modulus)
+                                                : TurningI(order, z, modulus);
+}
+
+ExponentialPair Single(const Exponential &term) { return {term, {{0, 0}, Plain({0, 0})}}; }
+
+ExponentialPair UpperI(double order, Complex z) {
+    const double modulus = Modulus(z);
+    if (SeriesHolds(order, modulus))
+        return Single(SeriesI(order, z, modulus));
+    switch (RegionOf(order, z, modulus)) {
+    case Region::Hankel:
+        return Hankel(order, z).i();
+    case Region::Debye:
+        return Debye({order, 0}, z).i();
+    case Region::Other:
+        break;
+    }
+    if (IsNextToAxis(order, z, modulus))
+        return AxisI(order, z, UpperK(order, z));
+    return Single(NearI(order, z, modulus));
+}
+
+ModifiedBoth UpperIAndK(double order, Complex z) {
+    const double modulus = Modulus(z);
+    switch (modulus < kFar && SeriesHolds(order, modulus) ? Region::Other
+                                                          : RegionOf(order, z, modulus)) {
+    case Region::Hankel: {
+        const Hankel hankel(order, z);
+        return {hankel.i(), hankel.k()};
+    }
+    case Region::Debye: {
+        const Debye debye({order, 0}, z);
+        return {debye.i(), debye.k()};
+    }
+    case Region::Other:
+        break;
+    }
+    const Exponential k = UpperK(order, z);
+    if (IsNextToAxis(order, z, modulus) && !SeriesHolds(order, modulus))
+        return {AxisI(order, z, k), k};
+    return {Single(NearI(order, z, modulus)), k};
 }
 
 } // namespace
@@ -487,6 +557,13 @@ ExponentialPair ModifiedI(double order, Complex z) {
 
 Exponential ModifiedK(double order, Complex z) {
     return std::signbit(z.im) ? Conjugate(UpperK(order, Conjugate(z))) : UpperK(order, z);
+}
+
+ModifiedBoth ModifiedIAndK(double order, Complex z) {
+    if (!std::signbit(z.im))
+        return UpperIAndK(order, z);
+    const ModifiedBoth both = UpperIAndK(order, Conjugate(z));
+    return {{Conjugate(both.i.first), Conjugate(both.i.second)}, Conjugate(both.k)};
 }
 
 } // namespace qx

@@ -34,6 +34,13 @@ struct ExponentialPair {
 ExponentialPair ModifiedI(double order, Complex z);
 Exponential ModifiedK(double order, Complex z);
 
+// Both, in less time than one after the other.
+struct ModifiedBoth {
+    ExponentialPair i;
+    Exponential k;
+};
+ModifiedBoth ModifiedIAndK(double order, Complex z);
+
 } // namespace qx
 
 #endif
