@@ -4,6 +4,7 @@
 #include "special/airy.h"
 #include "special/diagonal.h"
 #include "special/extended.h"
+#include "special/tables/debye.h"
 #include "special/tables/uniform.h"
 
 #include <cmath>
@@ -12,11 +13,13 @@ namespace qx {
 
 namespace {
 
+constexpr int kDebyeTerms = 10;
+
 // u_k(t) / order^k for t^2 = square, all real: t^k sits in `power`.
 template <class Term>
 void DebyeTerms(double order, double t, double square, Term term) {
     double power = 1;
-    for (int k = 0; k < table::debyeCount; ++k) {
+    for (int k = 0; k < kDebyeTerms; ++k) {
         double u = table::debye[k][k];
         for (int j = k - 1; j >= 0; --j)
             u = u * square + table::debye[k][j];
@@ -135,7 +138,7 @@ ComplexModifiedPair ModifiedBesselOnDiagonal(double order, double x) {
     Complex power = {1, 0};
     Complex sumI = {0, 0};
     Complex sumK = {0, 0};
-    for (int k = 0; k < table::debyeCount; ++k) {
+    for (int k = 0; k < kDebyeTerms; ++k) {
         Complex u = {table::debye[k][k], 0};
         for (int j = k - 1; j >= 0; --j)
             u = u * square + table::debye[k][j];

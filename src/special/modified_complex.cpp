@@ -6,6 +6,7 @@
 #include "special/rational.h"
 #include "special/reciprocal_gamma.h"
 #include "special/tables/bessel_complex.h"
+#include "special/tables/debye.h"
 
 #include <algorithm>
 #include <cmath>
@@ -87,8 +88,8 @@ Sums DebyeSums(double order, Complex s) {
     const double square = q.re * q.re + q.im * q.im;
     Sums sums = {kOne, kOne};
     Complex power = step;
-    for (int k = 1; k < table::longDebyeCount; ++k) {
-        const double(&c)[table::longDebyeCount] = table::longDebye[k];
+    for (int k = 1; k < table::debyeCount; ++k) {
+        const double(&c)[table::debyeCount] = table::debye[k];
         double upper = 0;
         double lower = c[k];
         for (int j = k - 1; j >= 1; --j) {

@@ -1,50 +1,23 @@
 #!/usr/bin/python3
 """Constants of the complex Bessel functions: src/special/tables/bessel_complex.h.
 
-The polynomials u_k of Debye's expansion (F. W. J. Olver, Asymptotics and Special Functions, 1974,
-chapter 10), logarithms and arc tangents in two doubles, and 1 / gamma(1 + x) about 0.
+Logarithms and arc tangents in two doubles, and 1 / gamma(1 + x) about 0.
 
 usage: bessel_complex.py > src/special/tables/bessel_complex.h
 """
 
-from fractions import Fraction
-
 from mpmath import atan, log, mp, mpf, pi, rgamma, taylor
 
+from debye import lines
+
 mp.dps = 60
-DEBYE = 20
 STEPS = 32
 RECIPROCAL = 24
-
-
-def debye_polynomials(count):
-    # u_{k+1}(t) = t^2 (1 - t^2) u_k'(t) / 2 + 1/8 int_0^t (1 - 5 s^2) u_k(s) ds; u_k = t^k times
-    # a polynomial in t^2, whose coefficients are kept here
-    u = [[Fraction(1)]]
-    while len(u) < count:
-        k = len(u) - 1
-        following = [Fraction(0)] * (k + 2)
-        for j, c in enumerate(u[-1]):
-            power = k + 2 * j
-            following[j] += c * power / 2 + c / (8 * (power + 1))
-            following[j + 1] += -c * power / 2 - 5 * c / (8 * (power + 3))
-        u.append(following)
-    return u
 
 
 def pair(value):
     high = float(value)
     return f"{{{high.hex()}, {float(value - high).hex()}}}"
-
-
-def lines(values, joint=", "):
-    text = line = ""
-    for value in values:
-        if line and len(line) + len(value) > 92:
-            text += f"    {line.rstrip()}\n"
-            line = ""
-        line += value + joint
-    return text + f"    {line.rstrip()}\n"
 
 
 print("""#ifndef QX_SPECIAL_TABLES_BESSEL_COMPLEX_H
@@ -58,14 +31,6 @@ print("""#ifndef QX_SPECIAL_TABLES_BESSEL_COMPLEX_H
 
 namespace qx::table {
 """)
-print("// u_k(t) = t^k times a polynomial in t^2 of degree k, ascending.")
-print(f"inline constexpr int longDebyeCount = {DEBYE};")
-print("inline constexpr double longDebye[longDebyeCount][longDebyeCount] = {")
-for row in debye_polynomials(DEBYE):
-    values = [repr(float(mpf(c.numerator) / c.denominator)) for c in row]
-    body = lines(values).strip().rstrip(",")
-    print(f"    {{{body}}},")
-print("};\n")
 print("// 1 / gamma(1 + x) = sum of c[k] x^k, for |x| <= 1/2.")
 print("inline constexpr double reciprocalGamma[] = {")
 print(lines([repr(float(c)) for c in taylor(lambda x: rgamma(1 + x), 0, RECIPROCAL - 1)])

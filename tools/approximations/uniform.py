@@ -9,38 +9,21 @@ usage: uniform.py REPOSITORY
 """
 
 import sys
-from fractions import Fraction
 
 from mpmath import factorial, log, mp, mpf, mpc, sqrt, gamma
 
+from debye import debye_polynomials
 from rational import Table
 
 COUNT = 10
 mp.dps = 80
 
 
-def debye_polynomials(count):
-    # u_{k+1}(t) = t^2 (1 - t^2) u_k'(t) / 2 + 1/8 int_0^t (1 - 5 s^2) u_k(s) ds
-    u = [{0: Fraction(1)}]
-    while len(u) < count:
-        following = {}
-
-        def add(power, value):
-            following[power] = following.get(power, Fraction(0)) + value
-        for power, c in u[-1].items():
-            add(power + 1, c * power / 2)
-            add(power + 3, -c * power / 2)
-            add(power + 1, c / (8 * (power + 1)))
-            add(power + 3, -5 * c / (8 * (power + 3)))
-        u.append(following)
-    return u
-
-
 U = debye_polynomials(COUNT)
 
 
 def u(k, t):
-    return sum(mpf(c.numerator) / c.denominator * t**p for p, c in U[k].items())
+    return sum(mpf(c.numerator) / c.denominator * t**(k + 2 * j) for j, c in enumerate(U[k]))
 
 
 def airy_u(k):
@@ -95,14 +78,4 @@ t.add("olverA1", "A1(zeta) + 1 in z - 1", lambda w: a(1)(w) + 1, low, high, 7, 4
 t.add("olverA2", "A2(zeta) + 1 in z - 1", lambda w: a(2)(w) + 1, low, high, 5, 3)
 t.add("olverB0", "B0(zeta) in z - 1", b(0), low, high, 8, 5)
 t.add("olverB1", "B1(zeta) + 1 in z - 1", lambda w: b(1)(w) + 1, low, high, 6, 4)
-t.lines.append("// u_k(t) = t^k times a polynomial in t^2 of degree k, ascending.")
-t.lines.append(f"inline constexpr int debyeCount = {COUNT};")
-t.lines.append(f"inline constexpr double debye[debyeCount][debyeCount] = {{")
-for k in range(COUNT):
-    row = [U[k].get(k + 2 * j, Fraction(0)) for j in range(k + 1)]
-    lines = t.values([mpf(c.numerator) / c.denominator for c in row])
-    lines[0] = "    {" + lines[0].strip()
-    lines[-1] += "},"
-    t.lines += lines
-t.lines += ["};", ""]
 t.write(sys.argv[1] + "/src/special/tables/uniform.h")
