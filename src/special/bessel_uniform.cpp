@@ -20,9 +20,9 @@ template <class Term>
 void DebyeTerms(double order, double t, double square, Term term) {
     double power = 1;
     for (int k = 0; k < kDebyeTerms; ++k) {
-        double u = table::debye[k][k];
+        double u = table::debye[0][k][k];
         for (int j = k - 1; j >= 0; --j)
-            u = u * square + table::debye[k][j];
+            u = u * square + table::debye[0][k][j];
         term(k, power * u);
         power *= t / order;
     }
@@ -139,9 +139,9 @@ ComplexModifiedPair ModifiedBesselOnDiagonal(double order, double x) {
     Complex sumI = {0, 0};
     Complex sumK = {0, 0};
     for (int k = 0; k < kDebyeTerms; ++k) {
-        Complex u = {table::debye[k][k], 0};
+        Complex u = {table::debye[0][k][k], 0};
         for (int j = k - 1; j >= 0; --j)
-            u = u * square + table::debye[k][j];
+            u = u * square + table::debye[0][k][j];
         const Complex term = power * u;
         sumI = sumI + term;
         sumK = k % 2 == 0 ? sumK + term : sumK - term;

@@ -1,6 +1,7 @@
 #include "special/modified_complex.h"
 
 #include "frame/constants.h"
+#include "frame/lanes.h"
 #include "special/extended.h"
 #include "special/order_recurrence.h"
 #include "special/rational.h"
@@ -53,9 +54,6 @@ Complex Inverse(Complex z) {
     return {z.re * scale, -z.im * scale};
 }
 ExtendedComplex Negative(ExtendedComplex e) { return {-e.re, -e.im}; }
-Complex Difference(const ExtendedComplex &a, const ExtendedComplex &b) {
-    return {(a.re - b.re).high, (a.im - b.im).high};
-}
 Complex Exp(Complex z) { return Value({kOne, Plain(z)}, Plain({0, 0})); }
 Complex TimesI(Complex z) { return {-z.im, z.re}; }
 Exponential Conjugate(const Exponential &term) {
@@ -80,32 +78,51 @@ struct Sums {
 };
 
 // sum u_k / order^k, where u_k / order^k = P_k(order^2 / s^2) / s^k with real polynomials P_k, each
-// by the recurrence for real coefficients (D. E. Knuth, The art of computer programming, 4.6.4).
-Sums DebyeSums(double order, Complex s) {
-    const Complex step = Inverse(s);
-    const Complex q = step * step * (order * order);
-    const double twice = 2 * q.re;
-    const double square = q.re * q.re + q.im * q.im;
-    Sums sums = {kOne, kOne};
-    Complex power = step;
-    for (int k = 1; k < table::debyeCount; ++k) {
-        const double(&c)[table::debyeCount] = table::debye[k];
-        double upper = 0;
-        double lower = c[k];
-        for (int j = k - 1; j >= 1; --j) {
-            const double next = (c[j] - square * upper) + twice * lower;
-            upper = lower;
-            lower = next;
+// by the recurrence for real coefficients (D. E. Knuth, The art of computer programming, 4.6.4);
+// and for N = 2 the sum of the v_k likewise.
+template <int N>
+struct DebyeSums {
+    Sums of[N];
+
+    DebyeSums(double order, Complex s) {
+        typedef Lanes<N> L;
+        constexpr std::ptrdiff_t toSlope = table::debyeCount * table::debyeCount;
+        const Complex step = Inverse(s);
+        const Complex q = step * step * (order * order);
+        const L twice(2 * q.re);
+        const L square(q.re * q.re + q.im * q.im);
+        L plainRe(1.0), plainIm(0.0), alternatingRe(1.0), alternatingIm(0.0);
+        Complex power = step;
+        double sign = -1;
+        for (int k = 1; k < table::debyeCount; ++k) {
+            const double *c = table::debye[0][k];
+            L upper(0.0);
+            L lower = L::gather(c + k, toSlope);
+            for (int j = k - 1; j >= 1; --j) {
+                const L next = (L::gather(c + j, toSlope) - square * upper) + twice * lower;
+                upper = lower;
+                lower = next;
+            }
+            const L re = (L::gather(c, toSlope) - square * upper) + L(q.re) * lower;
+            const L im = L(q.im) * lower;
+            const L termRe = L(power.re) * re - L(power.im) * im;
+            const L termIm = L(power.re) * im + L(power.im) * re;
+            plainRe = plainRe + termRe;
+            plainIm = plainIm + termIm;
+            alternatingRe = alternatingRe + L(sign) * termRe;
+            alternatingIm = alternatingIm + L(sign) * termIm;
+            double largest = 0;
+            for (int n = 0; n < N; ++n)
+                largest = std::max(largest, Size({termRe[n], termIm[n]}));
+            if (largest < kNegligible)
+                break;
+            sign = -sign;
+            power = power * step;
         }
-        const Complex term = power * Complex{c[0] + q.re * lower - square * upper, q.im * lower};
-        sums.plain += term;
-        sums.alternating = k % 2 == 0 ? sums.alternating + term : sums.alternating - term;
-        if (Size(term) < kNegligible)
-            break;
-        power = power * step;
+        for (int n = 0; n < N; ++n)
+            of[n] = {{plainRe[n], plainIm[n]}, {alternatingRe[n], alternatingIm[n]}};
     }
-    return sums;
-}
+};
 
 Sums HankelSums(double order, Complex z) {
     const Complex step = Inverse(z * 8);
@@ -143,7 +160,7 @@ struct Debye {
 
     Debye(Extended exactOrder, Complex at)
         : order(exactOrder.high), z(at), place(ExponentOfDebye(exactOrder, z)),
-          sums(DebyeSums(order, place.s)), scale(Inverse(RootOfUpperHalf(place.s))) {}
+          sums(DebyeSums<1>(order, place.s).of[0]), scale(Inverse(RootOfUpperHalf(place.s))) {}
     ExponentialPair i() const {
         const bool isBeyondStokesLine =
             z.im > order && place.exponent.im.high > kHalfPi * order;
@@ -154,6 +171,25 @@ struct Debye {
         return {scale * kRootHalfPi * sums.alternating, Negative(place.exponent)};
     }
 };
+
+// Two orders, order and one next to it, over exp(exponent).
+struct TwoOrders {
+    Complex first, second;
+    ExtendedComplex exponent;
+};
+
+// Debye's expansions of a function f and its derivative, which is +-s / z f but for the sums; with
+// it I_(order - 1) = I' + order / z I and K_(order + 1) = -K' + order / z K, where nothing cancels.
+TwoOrders DebyeTwo(Extended order, Complex z, bool isK) {
+    const DebyeExponent place = ExponentOfDebye(order, z);
+    const DebyeSums<2> sums(order.high, place.s);
+    const Complex scale =
+        Inverse(RootOfUpperHalf(place.s)) * (isK ? kRootHalfPi : kInverseRootTwoPi);
+    const Complex f = isK ? sums.of[0].alternating : sums.of[0].plain;
+    const Complex slope = isK ? sums.of[1].alternating : sums.of[1].plain;
+    return {scale * f, scale * ((place.s * slope + f * order.high) / z),
+            isK ? Negative(place.exponent) : place.exponent};
+}
 
 // Hankel's.
 struct Hankel {
@@ -271,12 +307,6 @@ Exponential MillerI(double order, Complex z, double modulus) {
     return {(wanted + wanted * correction) * Inverse(sum) * power * ReciprocalGammaNextToOne(mu),
             Plain(z)};
 }
-
-// K_mu and K_(mu+1).
-struct TwoOrders {
-    Complex first, second;
-    ExtendedComplex exponent;
-};
 
 // K_mu = sqrt(pi / (2 z)) exp(-z) U_0 / sum C_n U_n, where U_n is the confluent function
 // U(mu + 1/2 + n, 2 mu + 1, 2 z), C_n = (1/2 + mu)_n (1/2 - mu)_n / n!, and the U_n come downwards
@@ -409,32 +439,17 @@ Exponential Upwards(double order, int steps, Complex z, const TwoOrders &start) 
     return {k.value() * (1 / down), start.exponent};
 }
 
-// The value of a pair over exp(exponent).
-Complex Over(const ExtendedComplex &exponent, const ExponentialPair &pair) {
-    Complex sum = pair.first.factor * Exp(Difference(pair.first.exponent, exponent));
-    if (Size(pair.second.factor) != 0)
-        sum += pair.second.factor * Exp(Difference(pair.second.exponent, exponent));
-    return sum;
-}
-
-TwoOrders Joined(const Exponential &first, const Exponential &second) {
-    return {first.factor, second.factor * Exp(Difference(second.exponent, first.exponent)),
-            first.exponent};
-}
-
 // Next to the turning point: down from an order above it.
 Exponential TurningI(double order, Complex z, double modulus) {
     // of an order above that from which we start
     const double width = TurningWidth(0, modulus + 10 * std::cbrt(modulus) + 7);
     const double wide = std::sqrt(std::max(0.0, width * width - z.re * z.re));
     const int steps = std::max(1, static_cast<int>(std::ceil(z.im + wide - order)));
-    const ExponentialPair highest = Debye(ExactSum(order, steps + 1), z).i();
-    const ExponentialPair high = Debye(ExactSum(order, steps), z).i();
-    const ExtendedComplex exponent = high.first.exponent;
-    OrderRecurrence i(z, ExactSum(order, steps), -1, Over(exponent, highest), Over(exponent, high));
+    const TwoOrders start = DebyeTwo(ExactSum(order, steps + 1), z, false);
+    OrderRecurrence i(z, ExactSum(order, steps), -1, start.first, start.second);
     for (int k = steps; k >= 1; --k)
         i.advance();
-    return {i.value(), exponent};
+    return {i.value(), start.exponent};
 }
 
 // Next to the turning point: up from an order below it, or from next to 0.
@@ -444,10 +459,11 @@ Exponential TurningK(double order, Complex z, double modulus) {
     const int steps = static_cast<int>(std::ceil(order - (z.im - wide))) + 1;
     const double low = order - steps;
     if (low * low >= modulus && low > 0)
-        return Upwards(low, steps, z, Joined(Debye({low, 0}, z).k(), Debye(ExactSum(low, 1), z).k()));
+        return Upwards(low, steps, z, DebyeTwo({low, 0}, z, true));
     const SplitOrder split(order);
     return Upwards(split.mu, split.m, z,
-                   Joined(Hankel(std::fabs(split.mu), z).k(), Hankel(split.mu + 1, z).k()));
+                   {Hankel(std::fabs(split.mu), z).k().factor, Hankel(split.mu + 1, z).k().factor,
+                    Plain(-z)});
 }
 
 // Where the asymptotic expansions hold.
@@ -485,7 +501,7 @@ Exponential UpperK(double order, Complex z) {
 }
 
 bool IsNextToAxis(double order, Complex z, double modulus) {
-    return z.re <= kAxisWidth && z.im > order && modulus > kAxisFrom;
+    return z.re <= kAxisWidth && z.im > order && modulus > kAxisFrom && modulus < kFar;
 }
 
 // Next to the imaginary axis, where I oscillates: by K on both sides of the axis,

@@ -1,6 +1,7 @@
 #ifndef QX_SPECIAL_ORDER_RECURRENCE_H
 #define QX_SPECIAL_ORDER_RECURRENCE_H
 
+#include "frame/lanes.h"
 #include "special/complex_exponent.h"
 
 namespace qx {
@@ -14,42 +15,68 @@ public:
     // The first step is from `order` by `direction`, +1 or -1. For |z| below 1e-100, or values
     // above 2^996, the correction may be lost, and value() is the plain one.
     OrderRecurrence(Complex z, Extended order, double direction, Complex before, Complex present)
-        : step_(TwoOver(z)), before_{before, {0, 0}}, present_{present, {0, 0}} {
-        factor_ = {order * step_.re, order * step_.im};
-        if (direction < 0)
-            step_ = {-step_.re, -step_.im};
+        : before_(Pack(before)), beforeLow_(0.0), present_(Pack(present)), presentLow_(0.0) {
+        const ExtendedComplex step = TwoOver(z);
+        const ExtendedComplex factor = {order * step.re, order * step.im};
+        step_ = Pack({direction * step.re.high, direction * step.im.high});
+        stepLow_ = Pack({direction * step.re.low, direction * step.im.low});
+        factor_ = Pack({factor.re.high, factor.im.high});
+        factorLow_ = Pack({factor.re.low, factor.im.low});
     }
 
     void advance() {
-        const Complex c = {factor_.re.high, factor_.im.high};
-        const Complex rest = {factor_.re.low, factor_.im.low};
-        const Complex p = present_.high;
-        const Extended reRe = ExactProduct(c.re, p.re);
-        const Extended imIm = ExactProduct(c.im, p.im);
-        const Extended reIm = ExactProduct(c.re, p.im);
-        const Extended imRe = ExactProduct(c.im, p.re);
-        const Extended productRe = ExactSum(reRe.high, -imIm.high);
-        const Extended productIm = ExactSum(reIm.high, imRe.high);
-        const Extended re = ExactSum(productRe.high, before_.high.re);
-        const Extended im = ExactSum(productIm.high, before_.high.im);
-        const Complex local = {re.low + productRe.low + (reRe.low - imIm.low),
-                               im.low + productIm.low + (reIm.low + imRe.low)};
-        const Pair next = {{re.high, im.high},
-                           before_.low + c * present_.low + (rest * p + local)};
+        const Lanes<2> re = Evens(factor_, factor_);
+        const Lanes<2> im = Odds(factor_, factor_) * sign();
+        const Lanes<2> turned = present_.reversed();
+        const Sum2 one = Product(re, present_);
+        const Sum2 other = Product(im, turned);
+        const Sum2 product = Sum(one.high, other.high);
+        const Sum2 next = Sum(product.high, before_);
+        const Lanes<2> ofLow = re * presentLow_ + im * presentLow_.reversed();
+        const Lanes<2> ofFactor = Evens(factorLow_, factorLow_) * present_ +
+                                  Odds(factorLow_, factorLow_) * sign() * turned;
+        const Lanes<2> local = (one.low + other.low) + (product.low + next.low);
+        const Lanes<2> nextLow = beforeLow_ + ((ofFactor + local) + ofLow);
         before_ = present_;
-        present_ = next;
-        factor_ = {factor_.re + step_.re, factor_.im + step_.im};
+        beforeLow_ = presentLow_;
+        present_ = next.high;
+        presentLow_ = nextLow;
+        const Sum2 factor = Sum(factor_, step_);
+        factor_ = factor.high;
+        factorLow_ = factorLow_ + (stepLow_ + factor.low);
     }
 
-    Complex value() const { return Sum(present_); }
+    Complex value() const {
+        const Lanes<2> sum = present_ + presentLow_;
+        const Complex plain = {present_[0], present_[1]};
+        return std::isfinite(sum[0]) && std::isfinite(sum[1]) ? Complex{sum[0], sum[1]} : plain;
+    }
 
 private:
-    struct Pair {
-        Complex high, low;
+    struct Sum2 {
+        Lanes<2> high, low;
     };
-    static Complex Sum(const Pair &p) {
-        const Complex sum = p.high + p.low;
-        return std::isfinite(sum.re) && std::isfinite(sum.im) ? sum : p.high;
+    static Lanes<2> Pack(Complex z) {
+        const double parts[] = {z.re, z.im};
+        return Lanes<2>::gather(parts, 1);
+    }
+    static Lanes<2> sign() { return Pack({-1, 1}); }
+    // ExactSum and ExactProduct (frame/extended.h) of two parts each.
+    static Sum2 Sum(Lanes<2> a, Lanes<2> b) {
+        const Lanes<2> s = a + b;
+        const Lanes<2> t = s - a;
+        return {s, (a - (s - t)) + (b - t)};
+    }
+    static Sum2 Product(Lanes<2> a, Lanes<2> b) {
+        const Lanes<2> splitter(134217729.0); // 2^27 + 1
+        const Lanes<2> p = a * b;
+        const Lanes<2> ta = splitter * a;
+        const Lanes<2> ah = ta - (ta - a);
+        const Lanes<2> al = a - ah;
+        const Lanes<2> tb = splitter * b;
+        const Lanes<2> bh = tb - (tb - b);
+        const Lanes<2> bl = b - bh;
+        return {p, ((ah * bh - p) + ah * bl + al * bh) + al * bl};
     }
     static ExtendedComplex TwoOver(Complex z) {
         const Complex quotient = Complex{2, 0} / z;
@@ -60,9 +87,9 @@ private:
         return {{quotient.re, low.re}, {quotient.im, low.im}};
     }
 
-    ExtendedComplex step_;
-    ExtendedComplex factor_; // of the next step
-    Pair before_, present_;
+    Lanes<2> step_, stepLow_;
+    Lanes<2> factor_, factorLow_; // of the next step
+    Lanes<2> before_, beforeLow_, present_, presentLow_;
 };
 
 } // namespace qx

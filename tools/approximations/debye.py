@@ -1,5 +1,5 @@
 #!/usr/bin/python3
-"""The polynomials u_k of Debye's expansion, exactly: src/special/tables/debye.h.
+"""The polynomials u_k and v_k of Debye's expansions, exactly: src/special/tables/debye.h.
 
 Source: F. W. J. Olver, Asymptotics and Special Functions, 1974, chapter 10.
 
@@ -26,6 +26,17 @@ def debye_polynomials(count):
     return u
 
 
+def slope_polynomials(u):
+    # v_{k+1}(t) = u_{k+1}(t) - t (1 - t^2) (u_k(t) / 2 + t u_k'(t)), likewise
+    v = [list(row) for row in u]
+    for k, row in enumerate(u[:-1]):
+        for j, c in enumerate(row):
+            part = c * (Fraction(1, 2) + k + 2 * j)
+            v[k + 1][j] -= part
+            v[k + 1][j + 1] += part
+    return v
+
+
 def lines(values, joint=", "):
     text = line = ""
     for value in values:
@@ -46,12 +57,17 @@ def main():
 
 namespace qx::table {
 
-// u_k(t) = t^k times a polynomial in t^2 of degree k, ascending.""")
+// u_k(t), for the functions, and v_k(t), for their derivatives: t^k times a polynomial in t^2 of degree
+// k, ascending.""")
     print(f"inline constexpr int debyeCount = {COUNT};")
-    print("inline constexpr double debye[debyeCount][debyeCount] = {")
-    for row in debye_polynomials(COUNT):
-        body = lines([repr(c.numerator / c.denominator) for c in row]).strip().rstrip(",")
-        print(f"    {{{body}}},")
+    print("inline constexpr double debye[2][debyeCount][debyeCount] = {")
+    u = debye_polynomials(COUNT)
+    for rows in (u, slope_polynomials(u)):
+        print("    {")
+        for row in rows:
+            body = lines([repr(c.numerator / c.denominator) for c in row]).strip().rstrip(",")
+            print(f"    {{{body}}},")
+        print("    },")
     print("};\n\n} // namespace qx::table\n\n// clang-format on\n\n#endif")
 
 
