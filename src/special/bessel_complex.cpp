@@ -196,7 +196,9 @@ ComplexValue ComplexBessel(BesselKind kind, double order, CDB z, bool isScaled) 
         return Failed(BesselStatus::Singular);
     if (z.re == 0 && z.im == 0)
         return AtZero(kind, order);
-    const double size = std::max(std::fabs(order), std::hypot(z.re, z.im));
+    double size = std::max(std::fabs(order), std::fabs(z.re) + std::fabs(z.im));
+    if (size > kHalfLostFrom)
+        size = std::max(std::fabs(order), std::hypot(z.re, z.im));
     if (size > kAllLostFrom)
         return Failed(BesselStatus::AllLost);
     const bool isBelow = std::signbit(z.im);

@@ -22,12 +22,12 @@ constexpr double kDebyeFrom = 10;     // order, for smaller |z|
 constexpr double kTurningWidth = 8.2; // times max(|z|, order)^(1/3)
 constexpr double kAxisWidth = 1;      // |Re z| up to which I is taken from K on both sides
 constexpr double kAxisFrom = 5;       // |z| from which it is
-constexpr double kSeriesUpTo = 2.67;   // |z| + Re z, of Temme's series
+constexpr double kSeriesUpTo = 2;      // |z| + Re z, of Temme's series
 constexpr double kNegligible = 0x1p-56;
 constexpr double kRootHalfPi = 0x1.40d931ff62706p+0;
 constexpr Complex kOne = {1, 0};
 
-constexpr int kSteps = 160;
+constexpr int kSteps = 210;
 struct Inverses { // 1 / n
     double of[kSteps + 1] = {};
     constexpr Inverses() {
@@ -46,7 +46,11 @@ Extended LongAngle(Complex z) {
     return {angle.high, angle.low + table::extendedHalfPi.low};
 }
 double Angle(Complex z) { return LongAngle(z).high; }
-double Modulus(Complex z) { return std::hypot(z.re, z.im); }
+double Modulus(Complex z) {
+    const double largest = std::max(std::fabs(z.re), std::fabs(z.im));
+    return largest > 1e-140 && largest < 1e140 ? std::sqrt(z.re * z.re + z.im * z.im)
+                                               : std::hypot(z.re, z.im);
+}
 double Size(Complex z) { return std::fabs(z.re) + std::fabs(z.im); }
 Complex Conjugate(Complex z) { return {z.re, -z.im}; }
 Complex Inverse(Complex z) {
@@ -318,7 +322,8 @@ TwoOrders MillerK(double mu, Complex z, double modulus) {
     Complex u = kOne;
     Complex sum = u; // of C_m U_m from m = n on, over C_n / n!
     for (int n = start; n >= 1; --n) {
-        const Complex below = (z + n) * u * (2 * inverses.of[n]) -
+        const double twice = 2 * inverses.of[n];
+        const Complex below = Complex{2 + twice * z.re, twice * z.im} * u -
                               above * (coefficient(n + 1) * (inverses.of[n] * inverses.of[n + 1]));
         above = u;
         u = below;

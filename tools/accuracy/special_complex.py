@@ -1,17 +1,20 @@
 #!/usr/bin/python3
-"""Errors of the complex Bessel and Airy functions beside SciPy's on the same points, against mpmath:
-writes docs/accuracy/special_complex.md. Needs python3-mpmath and python3-scipy.
+"""Errors of the complex Bessel and Airy functions beside SciPy's on the same points: writes
+docs/accuracy/special_complex.md. The references are those of complex_bessel_reference.cpp, by ball
+arithmetic; some of them are compared with mpmath's first. Needs g++, libflint-arb-dev,
+python3-mpmath and python3-scipy.
 
-usage: special_complex.py [SECONDS]   (of measuring; 300 where none are given)
-
-The points are random and the same in every run; a longer time takes more of them.
+usage: special_complex.py [POINTS]             writes the page, 400 points a region if not told
+       special_complex.py --worst POINTS SEED  prints the worst points of all regions, first by error
+                                               over max(2 SciPy's, 6 eps), then by error over the bound
 """
 
+import collections
 import math
 import pathlib
 import random
+import subprocess
 import sys
-import time
 import warnings
 
 import mpmath
@@ -25,168 +28,240 @@ import qx  # noqa: E402
 
 mp.dps = 40
 EPS = 2.0**-52
+FLOOR = 6  # eps, from where an error may not be above twice SciPy's
 BESSEL = ("J", "Y", "I", "K", "H1", "H2")
+AIRY = ("Ai", "Ai'", "Bi", "Bi'")
 PEERS = ((special.jv, special.jve), (special.yv, special.yve), (special.iv, special.ive),
          (special.kv, special.kve), (special.hankel1, special.hankel1e),
          (special.hankel2, special.hankel2e))
+AIRY_REGION = "Airy functions, |z| to 200"
+
+# One value: where, of which function, what was found, and the errors of ours and SciPy's in eps.
+Row = collections.namedtuple("Row", "order z name scaled mine peer bound")
 
 
-def references(order, z):
-    """The six functions from I and K of |order| in the right half-plane; on a cut the side is that
-    of the sign of zero."""
-    below = math.copysign(1, z.imag) < 0
-    u, z = mpf(abs(order)), mpc(z.real, abs(z.imag))
-    w = mpc(z.imag, -z.real)
-    j = mpmath.expjpi(u / 2) * mpmath.besseli(u, w)
-    h1 = -2j / mp.pi * mpmath.expjpi(-u / 2) * mpmath.besselk(u, w)
-    y, h2 = 1j * (j - h1), 2 * j - h1
-    side = -z if z.real < 0 else z
-    i, k = mpmath.besseli(u, side), mpmath.besselk(u, side)
-    if z.real < 0:
-        i, k = mpmath.expjpi(u) * i, mpmath.expjpi(-u) * k - 1j * mp.pi * i
-    if order < 0:
-        c, s = mpmath.cospi(u), mpmath.sinpi(u)
-        j, y = c * j - s * y, s * j + c * y
-        h1, h2 = h1 * mpmath.expjpi(u), h2 * mpmath.expjpi(-u)
-        i += 2 / mp.pi * s * k
-    found = [j, y, i, k, h1, h2]
-    if below:
-        found = [mpmath.conj(v) for v in found]
-        found[4], found[5] = found[5], found[4]
-    return found
+def size_and_order(region, r):
+    if region == "orders and moduli to 30":
+        return r.uniform(0.1, 30), r.uniform(0, 30)
+    if region == "orders and moduli from 500 to 1000":
+        return r.uniform(500, 1000), r.uniform(500, 1000)
+    if region.startswith("turning line"):
+        order = 10**r.uniform(0, 3)
+        return abs(order + r.uniform(-6, 6) * order**(1 / 3)), order
+    if region == "|z| from 1e-12 to 0.1":
+        return 10**r.uniform(-12, -1), r.uniform(0, 20)
+    if region == "|z| from 1e3 to 1e6":
+        return 10**r.uniform(3, 6), 10**r.uniform(-1, 3)
+    if region == "orders from 1e-14 to 0.1":
+        return 10**r.uniform(-3, 2), 10**r.uniform(-14, -1)
+    return 10**r.uniform(-1, 3), 10**r.uniform(-1, 3)
 
 
-def modulus(one, other):
-    larger, smaller = max(abs(one), abs(other)), min(abs(one), abs(other))
-    return larger if larger < 100 * smaller else None
+def angle_of(region, r):
+    if region == "turning line, next to the axes":
+        return r.choice([0, math.pi / 2, math.pi, -math.pi / 2]) + r.gauss(0, 0.05)
+    if region == "next to the cut":
+        return math.pi - 10**r.uniform(-8, -1)
+    if region == "next to the imaginary axis":
+        return r.choice([1, -1]) * (math.pi / 2 + r.gauss(0, 0.01) * r.choice([1, 1e-4, 1e-8]))
+    return r.uniform(-math.pi, math.pi)
 
 
 def point(region, r):
-    """Order and argument."""
-    size, order = 10**r.uniform(-1, 3), 10**r.uniform(-1, 3)
-    angle = r.uniform(-math.pi, math.pi)
-    if region == "orders and moduli to 30":
-        size = r.uniform(0.1, 30)
-        order = r.choice([r.uniform(0, 30), float(r.randint(0, 10)), r.randint(0, 9) + 0.5])
-    elif region == "turning line, |z| near the order":
-        size = order = 10**r.uniform(0, 3)
-        size += r.uniform(-4, 4) * order**(1 / 3)
-        angle = r.choice([angle, math.pi / 2, r.gauss(0, 0.05), math.pi + r.gauss(0, 0.03)])
-    elif region == "next to the cut":
-        angle = math.pi - 10**r.uniform(-8, -1)
-    elif region == "imaginary axis":
-        angle = r.choice([1, -1]) * math.pi / 2 + r.gauss(0, 0.01)
-    elif region == "|z| from 1e-12 to 0.1":
-        size = 10**r.uniform(-12, -1)
-        order = r.choice([r.uniform(0, 20), float(r.randint(0, 8))])
-    elif region == "|z| from 1e3 to 1e6":
-        size = 10**r.uniform(3, 6)
-    elif region == "orders and moduli from 500 to 1000":
-        size, order = r.uniform(500, 1000), r.uniform(500, 1000)
-    if r.random() < 0.3:
+    """Order and argument: whole, half and other orders of both signs."""
+    size, order = size_and_order(region, r)
+    form = r.randrange(5)
+    if form == 0:
+        order = float(round(order))
+    elif form == 1:
+        order = math.floor(order) + 0.5
+    elif form == 2 and r.random() < 0.3:
+        order = round(order) + r.choice([1, -1]) * 10**r.uniform(-12, -2)
+    if r.random() < 0.4:
         order = -order
     if region == "positive axis":
         return order, complex(size, 0.0)
     if region == "negative axis":
         return order, complex(-size, r.choice([0.0, -0.0]))
+    if region == "imaginary axis":
+        return order, complex(0.0, r.choice([size, -size]))
+    angle = angle_of(region, r)
     return order, complex(size * math.cos(angle), size * math.sin(angle))
 
 
 REGIONS = ("orders and moduli to 30", "orders and moduli to 1000",
            "orders and moduli from 500 to 1000", "turning line, |z| near the order",
-           "positive axis", "negative axis", "next to the cut", "imaginary axis",
+           "turning line, next to the axes", "positive axis", "negative axis", "next to the cut",
+           "imaginary axis", "next to the imaginary axis", "orders from 1e-14 to 0.1",
            "|z| from 1e-12 to 0.1", "|z| from 1e3 to 1e6")
 
 
-def error(found, value, scale):
-    return float(abs(mpc(complex(found)) - value) / scale) / EPS if np.isfinite(found) else math.inf
+class References:
+    def __init__(self):
+        folder = ROOT / "build/release"
+        self.program = folder / "complex_bessel_reference"
+        source = pathlib.Path(__file__).with_name("complex_bessel_reference.cpp")
+        subprocess.run(["g++", "-std=c++20", "-O2", "-o", self.program, source, "-lflint-arb", "-lflint"],
+                       check=True)
+
+    def __call__(self, lines, functions):
+        """An array: point, function, what is in a line of the program."""
+        text = subprocess.run([self.program], input="\n".join(lines), text=True, check=True,
+                              capture_output=True).stdout
+        return np.array(text.split(), dtype=float).reshape(len(lines), functions, 9)
 
 
-def measure_bessel(order, z, add):
-    exact = mpc(z)
-    values = references(order, z)
-    decay = mpmath.exp(-abs(exact.imag))
-    scales = (decay, decay, mpmath.exp(-abs(exact.real)), mpmath.exp(exact),
-              mpmath.exp(-1j * exact), mpmath.exp(1j * exact))
-    pair = modulus(values[0], values[1])
+def check_against_mpmath(references):
+    r = random.Random(5)
+    points = [point("orders and moduli to 30", r) for _ in range(40)]
+    found = references([f"bessel {order!r} {z.real!r} {z.imag!r}" for order, z in points], 6)
+    for (order, z), values in zip(points, found):
+        for k, function in enumerate((mpmath.besselj, mpmath.bessely, mpmath.besseli,
+                                      mpmath.besselk, mpmath.hankel1, mpmath.hankel2)):
+            with mp.workdps(80):  # the Hankel functions of mpmath cancel
+                value = function(mpf(order), mpc(z))
+            ours = mpc(mpf(values[k][0]) + mpf(values[k][1]), mpf(values[k][2]) + mpf(values[k][3]))
+            assert abs(ours - value) < 1e-28 * abs(value), (order, z, k)
+
+
+def error(found, parts, size):
+    """In eps, of an array."""
+    distance = np.hypot((found.real - parts[:, 0]) - parts[:, 1], (found.imag - parts[:, 2]) - parts[:, 3])
+    return np.where(np.isfinite(found), distance / size / EPS, np.inf)
+
+
+def called(name, *arguments):
+    """NaN where a call fails."""
+    def one(*a):
+        try:
+            return qx.call(name, *a)
+        except qx.QxError:
+            return complex(math.nan, math.nan)
+    return np.array([one(*(v.item() for v in a)) for a in zip(*arguments)])
+
+
+def rows_of(values, k, partner, scaled, mine, peer, where, bound):
+    """The values of a function that a double holds."""
+    parts = values[:, k, 4 * scaled:4 * scaled + 4]
+    size = np.hypot(parts[:, 0], parts[:, 2])
+    inside = np.isfinite(size) & (size > 1e-290) & (size < 1e305)
+    modulus = size * np.maximum(1, values[:, k, 8])
+    if partner is not None:  # the pair and the function's scale
+        one, two = (np.hypot(*values[:, p, [0, 2]].T) for p in partner)
+        larger, smaller = np.maximum(one, two), np.minimum(one, two)
+        own = np.hypot(*values[:, k, [0, 2]].T)
+        near = (larger < 100 * smaller) & (own > 0)
+        modulus = np.where(near, np.maximum(modulus, larger * size / np.where(near, own, 1)), modulus)
+    ours, theirs = error(mine, parts, modulus), error(peer, parts, modulus)
+    return [Row(*where(i), scaled, ours[i], theirs[i], bound[i]) for i in np.nonzero(inside)[0]]
+
+
+def bessel_rows(points, references):
+    order, z = np.array([p[0] for p in points]), np.array([p[1] for p in points])
+    values = references([f"bessel {v!r} {w.real!r} {w.imag!r}" for v, w in points], 6)
+    bound = 100 * (1 + np.maximum(abs(order), abs(z)) / 10)
+    rows = []
     for k, name in enumerate(BESSEL):
         for scaled in (0, 1):
-            value = values[k] * scales[k] if scaled else values[k]
-            if not 1e-290 < abs(value) < 1e305:
-                continue
-            size = abs(value)
-            if pair and name not in "IK":
-                size = pair * (abs(scales[k]) if scaled else 1)
-            ours = qx.call(f"QX_CxBessel{name}r", order, z, scaled)
-            peer = PEERS[k][scaled](order, z)
-            mine = error(ours, value, size)
-            if mine > 1e6 and abs(ours - peer) < 1e-9 * abs(ours):
-                add(None)  # mpmath's own value is wrong, as next to z = i order at times
-                continue
-            add((name, mine, error(peer, value, size), 100 * (1 + max(abs(order), abs(z)) / 10)))
+            mine = called(f"QX_CxBessel{name}r", order, z, np.full(len(z), scaled))
+            rows += rows_of(values, k, None if name in "IK" else (0, 1), scaled, mine,
+                            PEERS[k][scaled](order, z), lambda i: (order[i], z[i], name), bound)
+    return rows
 
 
-AIRY = ("AiryAi", "AiryAiP", "AiryBi", "AiryBiP")
-
-
-def measure_airy(z, add):
-    exact = mpc(z)
-    values = [f(exact, derivative=d) for f in (mpmath.airyai, mpmath.airybi) for d in (0, 1)]
-    zeta = mpf(2) / 3 * exact * mpmath.sqrt(exact)
+def airy_rows(z, references):
+    values = references([f"airy {float(w.real)!r} {float(w.imag)!r}" for w in z], 4)
     peers = special.airy(z), special.airye(z)
+    rows = []
     for k, name in enumerate(AIRY):
-        size = modulus(values[k], values[k ^ 2]) or abs(values[k])
         for scaled in (0, 1):
-            factor = (mpmath.exp(zeta) if k < 2 else mpmath.exp(-abs(zeta.real))) if scaled else 1
-            if 1e-290 < abs(values[k] * factor) < 1e305:
-                add((name[4:].replace("P", "'"), error(qx.call("QX_Cx" + name, z, scaled),
-                                                       values[k] * factor, size * abs(factor)),
-                     error(peers[scaled][k], values[k] * factor, size * abs(factor)),
-                     100 * (1 + abs(z) / 10) + abs(z)**1.5))
+            bound = 100 * (1 + abs(z) / 10) + (0 if scaled else abs(z)**1.5)
+            mine = called("QX_CxAiry" + name.replace("'", "P"), z, np.full(len(z), scaled))
+            rows += rows_of(values, k, (k, k ^ 2), scaled, mine, peers[scaled][k],
+                            lambda i: (None, z[i], name), bound)
+    return rows
 
 
-def table(title, rows, names, left_out):
-    print_ = [f"### {title}", "", "| Function | Values | Median | Peak | Peak over the bound | "
-              "SciPy's median | SciPy's peak |", "|---|--:|--:|--:|--:|--:|--:|"]
-    for name in names:
-        ours = sorted(r[1] for r in rows if r[0] == name)
-        peer = sorted(r[2] for r in rows if r[0] == name)
-        if not ours:
-            continue
-        share = max(r[1] / r[3] for r in rows if r[0] == name)
-        worst = f"{peer[-1]:.3g}" if math.isfinite(peer[-1]) else "fails"
-        print_.append(f"| {name} | {len(ours)} | {ours[len(ours) // 2]:.2f} | {ours[-1]:.3g} | "
-                      f"{share:.2g} | {peer[len(peer) // 2]:.2f} | {worst} |")
-    if left_out:
-        print_ += ["", f"{left_out} values are left out, of which both agree to 9 digits and mpmath's "
-                   "is another."]
-    return print_ + [""]
+def airy_points(count, r):
+    angles = [r.choice([r.uniform(-math.pi, math.pi), math.pi, 0, math.pi / 3 + r.gauss(0, 0.01)])
+              for _ in range(count)]
+    return np.array([10**r.uniform(-1.5, 2.3) * complex(math.cos(a), math.sin(a) if a % math.pi else 0)
+                     for a in angles])
+
+
+def measured(region, count, references, seed=1):
+    r = random.Random(f"{region} {seed}")
+    if region == AIRY_REGION:
+        return airy_rows(airy_points(count, r), references)
+    return bessel_rows([point(region, r) for _ in range(count)], references)
+
+
+def over_peer(row):
+    return row.mine / max(2 * row.peer, FLOOR)
+
+
+def figure(x):
+    return f"{x:.3g}" if math.isfinite(x) else "fails"
+
+
+def table(title, rows):
+    lines = [f"### {title}", "", "| Function | Values | Median | Peak | Peak over the bound | Peak over "
+             "max(2 SciPy's, 6) | SciPy's median | SciPy's peak |", "|---|--:|--:|--:|--:|--:|--:|--:|"]
+    for name in AIRY if title == AIRY_REGION else BESSEL:
+        of_name = [row for row in rows if row.name == name]
+        ours, peer = np.array([row.mine for row in of_name]), np.array([row.peer for row in of_name])
+        lines.append(f"| {name} | {len(of_name)} | {np.median(ours):.2f} | {figure(ours.max())} | "
+                     f"{max(row.mine / row.bound for row in of_name):.2g} | "
+                     f"{max(map(over_peer, of_name)):.2f} | {figure(np.median(peer))} | {figure(peer.max())} |")
+    return lines + [""]
+
+
+HEAD = f"""# Accuracy: complex Bessel and Airy functions
+
+Errors in units of eps = 2.2e-16 against ball arithmetic of at least 110 bits, unscaled and scaled
+values together, at random points of each region, whole, half and other orders of both signs. An error
+is relative to the modulus: the larger of |J| and |Y| (Ai and Bi) where they are within 100 of each
+other, else the value itself; for I and K always the value. Next to a zero of a function the modulus
+is the amplitude of its oscillation there, |f'| |z| / sqrt |order^2 - z^2| (with + for I and K).
+Relative to the value itself an error grows without bound towards a zero.
+
+The bound is 100 (1 + max(|order|, |z|) / 10), and |z|^1.5 more for unscaled Airy functions. SciPy's
+error at a single point may be anything down to 0, so that twice SciPy's is asked for from {FLOOR} eps
+on: the column "peak over max(2 SciPy's, {FLOOR})" stays below 1. Made by
+`tools/accuracy/special_complex.py`, with SciPy {{}}; `--worst` searches for the worst points.
+"""
+
+
+def write_page(count, references):
+    import scipy
+    lines = HEAD.format(scipy.__version__).splitlines() + [""]
+    for region in REGIONS + (AIRY_REGION,):
+        lines += table(region, measured(region, count, references))
+        print(region, flush=True)
+    (ROOT / "docs/accuracy/special_complex.md").write_text("\n".join(lines).rstrip() + "\n")
+
+
+def print_worst(count, seed, references):
+    rows = []
+    for region in REGIONS + (AIRY_REGION,):
+        rows += measured(region, count, references, seed)
+    print(f"{len(rows)} values, peak {max(row.mine for row in rows):.3g} eps")
+    for title, share in (("over max(2 SciPy's, 6 eps)", over_peer),
+                         ("over the bound", lambda row: row.mine / row.bound)):
+        print(title)
+        for row in sorted(rows, key=share)[:-13:-1]:
+            print(f"  {share(row):8.3g}  {row.name}{' scaled' if row.scaled else ''}, order {row.order!r}, "
+                  f"z {row.z!r}: {row.mine:.3g} eps, SciPy's {row.peer:.3g}")
 
 
 def main():
-    seconds = float(sys.argv[1]) if len(sys.argv) > 1 else 300
     warnings.simplefilter("ignore")
-    lines = ["# Accuracy: complex Bessel and Airy functions", "",
-             "Errors in units of eps = 2.2e-16 against mpmath at 40 digits, unscaled and scaled values",
-             "together, at random points of each region, orders of both signs. An error is relative to the",
-             "modulus: the larger of |J| and |Y| (Ai and Bi) where they are within 100 of each other, else",
-             "the value itself; for I and K always the value, zeros of I included. The bound is 100 (1 +",
-             "max(|order|, |z|) / 10), and |z|^1.5 more for Airy functions. Made by",
-             "`tools/accuracy/special_complex.py`.", ""]
-    for region in REGIONS + ("Airy functions, |z| to 100",):
-        random_, rows, end = random.Random(1), [], time.time() + seconds / (len(REGIONS) + 1)
-        while time.time() < end:
-            try:
-                if region.startswith("Airy"):
-                    size, angle = 10**random_.uniform(-1, 2), random_.uniform(-math.pi, math.pi)
-                    measure_airy(complex(size * math.cos(angle), size * math.sin(angle)), rows.append)
-                else:
-                    measure_bessel(*point(region, random_), rows.append)
-            except (mpmath.NoConvergence, qx.QxError, ValueError):
-                continue
-        names = [name[4:].replace("P", "'") for name in AIRY] if "Airy" in region else BESSEL
-        lines += table(region, [r for r in rows if r], names, sum(r is None for r in rows))
-    (ROOT / "docs/accuracy/special_complex.md").write_text("\n".join(lines).rstrip() + "\n")
+    references = References()
+    check_against_mpmath(references)
+    if sys.argv[1:2] == ["--worst"]:
+        print_worst(int(sys.argv[2]), sys.argv[3], references)
+    else:
+        write_page(int(sys.argv[1]) if len(sys.argv) > 1 else 400, references)
 
 
 if __name__ == "__main__":

@@ -77,7 +77,7 @@ Found Call(const std::string &name, double order, CDB z, bool scaled = false) {
 double Size(CDB z) { return std::hypot(z.re, z.im); }
 
 TEST(SpecialComplex, AgreesWithReferencesOnBothSidesOfEachThreshold) {
-    EXPECT_GT(qx::test::ExpectAgreement(Exports(), qx::test::TestData("special_complex.dat")), 1400);
+    EXPECT_GT(qx::test::ExpectAgreement(Exports(), qx::test::TestData("special_complex.dat")), 1850);
 }
 
 TEST(SpecialComplex, ReportsWhatCannotBeComputed) {
@@ -179,7 +179,9 @@ TEST(SpecialComplex, KeepsTheWronskians) {
     qx::test::Noise noise(7);
     for (int i = 0; i < 4000; ++i) {
         const double modulus = std::exp2(13 * noise.positive() - 3);
-        const double order = std::exp2(12 * noise.positive() - 2) + (i % 3 == 0 ? modulus : 0);
+        // whole, half and other orders to which 1 can be added exactly, a third about the modulus
+        const double any = std::exp2(12 * noise.positive() - 2) + (i % 3 == 0 ? modulus : 0);
+        const double order = std::ldexp(std::floor(std::ldexp(any, i % 20)), -(i % 20));
         const double angle = 0.5 * kPi * noise.symmetric();
         const CDB z = {modulus * std::cos(angle), modulus * std::sin(angle)};
         const Found i0 = Call("BesselI", order, z, true);
@@ -193,7 +195,7 @@ TEST(SpecialComplex, KeepsTheWronskians) {
         // exp(z) of K times exp(-Re z) of I
         const CDB turn = {std::cos(z.im), std::sin(z.im)};
         const CDB rest = first + second - turn / z;
-        EXPECT_LE(Size(rest), 1e-14 * (1 + order + modulus) * (Size(first) + Size(second)))
+        EXPECT_LE(Size(rest), 6e-15 * (Size(first) + Size(second)))
             << order << ' ' << z.re << ' ' << z.im;
     }
     for (int i = 0; i < 1000; ++i) {

@@ -20,7 +20,7 @@ CUT = -0.0
 # About each threshold of special/modified_complex.h, on both sides of it.
 POINTS = [
     # power series, Temme's series and Miller's recurrences
-    (0, 0.3 + 0.4j), (0, 1e-9 - 1e-9j), (0.3, 1.4 + 0.1j), (0.3, 1.6 + 0.1j), (0.5, 2.1j),
+    (0, 0.3 + 0.4j), (0, 1e-9 - 1e-9j), (0.3, 1.3 + 0.1j), (0.3, 1.4 + 0.1j), (0.5, 2.1j),
     (0.5, 3.1j), (-0.5, 2 + 1j), (2, -1.2 + 0.9j), (-2.7, 2 + 2j), (7.25, 5 - 2j), (9.9, 1e-3j),
     (15.4, 0.3 + 6.4j), (3, 20.3 + 0j), (-3.5, 8.9 + 18j), (12.1, 0.7 - 17j), (25, 21.5 + 3j),
     (1.5, -4.9 + 0.2j), (1.5, -5.2 + 0.2j), (33.3, 13 + 14j), (0.49, 4 - 0.9j), (0.49, 4 - 1.1j),
@@ -34,6 +34,16 @@ POINTS = [
     (30, 30 + 0.5j), (50.5, 49 + 0j), (-75.3, 70 - 2j), (100, -104 + 3j), (120, 5 + 118j),
     (1000, 1000 + 0j), (-1000.5, 990 + 12j), (23.98, 51 + 0.01j),
     (39.2, -60 + 2.5j),
+    # recurrences of many steps, with orders that a step of 1 rounds
+    (27.912295757733457, -40.1 + 0.3j), (7.475119377612192, 1.5507676424686374 + 23.66247951133564j),
+    (7.5, 17.6 - 15.8j), (39.2, -2.5 + 60j), (711.9449826288628, -675.7671276891441 + 6.4195506472302615j),
+    (884.5884620119281, 10.673553636174256 + 942.0907889518545j),
+    (240.06190640390335, 238.60706316676652 - 1.7936751134430586j),
+    (22.52665812590174, 38.6901818812177 - 1.6122348486454139j),
+    (36, 12.332749752640316 - 4.008275788979722j), (29, 0.7570295473304611 - 14.09690200470789j),
+    # tiny orders, half orders, tiny moduli
+    (-1e-11, 2.2 - 0.4j), (1e-4, 0.37 - 0.65j), (-0.5, 1.07 - 1.1j), (3.5, -2.97j),
+    (7.636008778574624, 7.6e-13 - 9.3e-13j), (15.4, 3e-9 + 1e-8j),
     # the negative axis
     (0, complex(-3, 0)), (0.7, complex(-8, CUT)), (2, complex(-2.5, CUT)), (60.5, complex(-61, 0)),
     (-1.3, complex(-0.4, CUT)), (4.25, complex(-30, 0)),
@@ -103,9 +113,9 @@ def rows(order, z, found, tolerance):
 for order, z in POINTS:
     upper = mpc(z.real, abs(z.imag))
     mp.dps = 60 + min(100, int(abs(z.imag)))
-    rows(order, z, functions(mpf(order), upper), 30 + max(abs(order), abs(z)))
+    rows(order, z, functions(mpf(order), upper), 24)
 mp.dps = 60
 for z in ARGUMENTS:
     upper = mpc(z.real, abs(z.imag))
     mp.dps = 60 + int(0.3 * abs(z)**1.5)
-    rows(0, z, airy_functions(upper), 30)
+    rows(0, z, airy_functions(upper), 16)
