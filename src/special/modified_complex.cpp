@@ -253,10 +253,10 @@ Exponential SeriesI(double order, Complex z, double modulus) {
     if (order == 0)
         return {sum, Plain({0, 0})};
     const double size = PowerOverGamma(0.5 * modulus, order);
-    if (order < 4)
-        return {sum * size, {{0, 0}, Extended{order, 0} * LongAngle(z)}};
-    const Extended angle = ExtendedArgument({z.re, 0}, {z.im, 0}) * Extended{order, 0};
-    return {sum * size, {{0, RoundingInPower(order, z, modulus)}, angle}};
+    const double rounding = order < 2 ? 0 : RoundingInPower(order, z, modulus);
+    const Extended angle =
+        order < 4 ? LongAngle(z) : ExtendedArgument({z.re, 0}, {z.im, 0});
+    return {sum * size, {{0, rounding}, angle * Extended{order, 0}}};
 }
 
 // order = mu + m with |mu| <= 1/2.
