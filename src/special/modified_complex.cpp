@@ -20,6 +20,7 @@ namespace {
 constexpr double kFar = 22;           // from where asymptotic sums have all digits
 constexpr double kDebyeFrom = 10;     // order, for smaller |z|
 constexpr double kTurningWidth = 8.2; // times max(|z|, order)^(1/3)
+constexpr double kLongWayUp = 25;     // orders that take as long as Debye's expansion
 constexpr double kAxisWidth = 1;      // |Re z| up to which I is taken from K on both sides
 constexpr double kAxisFrom = 5;       // |z| from which it is
 constexpr double kSeriesUpTo = 2;      // |z| + Re z, of Temme's series
@@ -463,12 +464,10 @@ Exponential TurningK(double order, Complex z, double modulus) {
     const double wide = std::sqrt(std::max(0.0, width * width - z.re * z.re));
     const int steps = static_cast<int>(std::ceil(order - (z.im - wide))) + 1;
     const double low = order - steps;
-    if (low * low >= modulus && low > 0)
+    if (low > kLongWayUp)
         return Upwards(low, steps, z, DebyeTwo({low, 0}, z, true));
     const SplitOrder split(order);
-    return Upwards(split.mu, split.m, z,
-                   {Hankel(std::fabs(split.mu), z).k().factor, Hankel(split.mu + 1, z).k().factor,
-                    Plain(-z)});
+    return Upwards(split.mu, split.m, z, MillerK(split.mu, z, modulus));
 }
 
 // Where the asymptotic expansions hold.
