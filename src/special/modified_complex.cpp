@@ -23,7 +23,7 @@ constexpr double kTurningWidth = 8.2; // times max(|z|, order)^(1/3)
 constexpr double kLongWayUp = 25;     // orders that take as long as Debye's expansion
 constexpr double kAxisWidth = 1;      // |Re z| up to which I is taken from K on both sides
 constexpr double kAxisFrom = 5;       // |z| from which it is
-constexpr double kSeriesUpTo = 2;      // |z| + Re z, of Temme's series
+constexpr double kSeriesUpTo = 2;     // |z| + Re z, of Temme's series
 constexpr double kNegligible = 0x1p-56;
 constexpr double kRootHalfPi = 0x1.40d931ff62706p+0;
 constexpr Complex kOne = {1, 0};
@@ -38,8 +38,8 @@ struct Inverses { // 1 / n
 };
 constexpr Inverses inverses;
 
-// The argument of a z in the first quadrant; the first has the rounding of an arc tangent up to pi/4
-// alone.
+// The argument of a z in the first quadrant; the first has the rounding of an arc tangent up to
+// pi/4 alone.
 Extended LongAngle(Complex z) {
     if (z.im <= z.re)
         return {std::atan(z.im / z.re), 0};
@@ -167,8 +167,7 @@ struct Debye {
         : order(exactOrder.high), z(at), place(ExponentOfDebye(exactOrder, z)),
           sums(DebyeSums<1>(order, place.s).of[0]), scale(Inverse(RootOfUpperHalf(place.s))) {}
     ExponentialPair i() const {
-        const bool isBeyondStokesLine =
-            z.im > order && place.exponent.im.high > kHalfPi * order;
+        const bool isBeyondStokesLine = z.im > order && place.exponent.im.high > kHalfPi * order;
         return TwoExponentials(order, scale, place.exponent, sums.plain, sums.alternating,
                                isBeyondStokesLine && place.exponent.re.high < 20);
     }
@@ -255,8 +254,7 @@ Exponential SeriesI(double order, Complex z, double modulus) {
         return {sum, Plain({0, 0})};
     const double size = PowerOverGamma(0.5 * modulus, order);
     const double rounding = order < 2 ? 0 : RoundingInPower(order, z, modulus);
-    const Extended angle =
-        order < 4 ? LongAngle(z) : ExtendedArgument({z.re, 0}, {z.im, 0});
+    const Extended angle = order < 4 ? LongAngle(z) : ExtendedArgument({z.re, 0}, {z.im, 0});
     return {sum * size, {{0, rounding}, angle * Extended{order, 0}}};
 }
 
@@ -287,7 +285,7 @@ Exponential MillerI(double order, Complex z, double modulus) {
     Complex p = kOne;
     Complex sum = p; // of the terms from k on, over the weight of k
     Complex wanted = p;
-    Complex ratio = {0, 0};
+    Complex next = {0, 0}; // of the order above
     for (int k = start; k >= 1; --k) {
         const double rounded = mu + k;
         const double rest = mu - (rounded - k);
@@ -301,15 +299,14 @@ Exponential MillerI(double order, Complex z, double modulus) {
         sum = p + sum * weight;
         if (k - 1 == split.m) {
             wanted = p;
-            ratio = above;
+            next = above;
         }
     }
     const Complex power = Exp(Complex{std::log(0.5 * modulus), Angle(z)} * mu);
-    // The sum is that of a z next to z, whose power and exponential are not those of z.
-    const Complex excess = ExcessOfInverse(z, step * 0.5); // z next to z is z (1 - excess)
-    const Complex slope = z * (ratio * Inverse(wanted) - kOne) + split.m; // of the logarithm, times z
-    const Complex correction = excess * slope;
-    return {(wanted + wanted * correction) * Inverse(sum) * power * ReciprocalGammaNextToOne(mu),
+    // All that is of z (1 - excess), but for its power and exponential.
+    const Complex excess = ExcessOfInverse(z, step * 0.5);
+    const Complex slope = z * (next - wanted) + wanted * split.m;
+    return {(wanted + excess * slope) * Inverse(sum) * power * ReciprocalGammaNextToOne(mu),
             Plain(z)};
 }
 
@@ -341,15 +338,16 @@ TwoOrders HalfOrderK(Complex z) {
     return {value, value, Plain(-z)};
 }
 
-// (z/2)^-mu and its inverse, and sinh(s) / s of the exponent s.
+// (z/2)^-mu and its inverse, sinh(s) / s of the exponent s, and the logarithm of 2 / z.
 struct PowersOfHalf {
-    Complex grow, decay, sinc, logarithm; // the latter of 2 / z
+    Complex grow, decay, sinc, logarithm;
+
     PowersOfHalf(double mu, Complex z, double modulus) {
         int exponent;
-        const double mantissa = std::frexp(0.5 * modulus, &exponent);
+        const double mantissa = std::frexp(modulus, &exponent);
         // For a small |z| the rounding of the logarithm would be one of the power.
         const double part = std::log(mantissa);
-        const Extended turns = {static_cast<double>(-exponent), 0};
+        const Extended turns = {static_cast<double>(1 - exponent), 0};
         const Extended logOfSize = turns * table::extendedLnTwo + Extended{-part, 0};
         const double angle = Angle(z);
         logarithm = {logOfSize.high, -angle};
@@ -374,8 +372,41 @@ struct PowersOfHalf {
 };
 
 // The two series of Temme about z = 0, sum q^k / k! f_k and sum q^k / k! (p_k - k f_k) with
-// f_k = (k f_(k-1) + p_(k-1) + q_(k-1)) / (k^2 - mu^2), each a sum of three power series with real
-// coefficients times what depends on the power of z.
+// f_k = (k f_(k-1) + p_(k-1) + q_(k-1)) / (k^2 - mu^2), p_k = p_(k-1) / (k - mu) and
+// q_k = q_(k-1) / (k + mu): what the terms have of f_0, p_0 and q_0, over k!, is real.
+struct TemmeTerms {
+    static constexpr int most = 20;
+    double first[3][most] = {{1}, {0}, {0}};
+    double second[3][most] = {{0}, {1}, {0}};
+    int last = 0;
+
+    TemmeTerms(double mu, double size) {
+        double p = 1;
+        double q = 1;
+        double term = 1;
+        while (last + 1 < most && term > kNegligible) {
+            const int k = ++last;
+            const double scale = inverses.of[k] / ((k - mu) * (k + mu));
+            first[0][k] = scale * (k * first[0][k - 1]);
+            first[1][k] = scale * (k * first[1][k - 1] + p);
+            first[2][k] = scale * (k * first[2][k - 1] + q);
+            p *= (k + mu) * scale;
+            q *= (k - mu) * scale;
+            second[0][k] = -k * first[0][k];
+            second[1][k] = p - k * first[1][k];
+            second[2][k] = -k * first[2][k];
+            term *= size * scale * k;
+        }
+    }
+    Complex sum(const double (&of)[3][most], const Complex (&start)[3], Complex q) const {
+        Complex sums[3] = {};
+        for (int k = last; k >= 0; --k)
+            for (int n = 0; n < 3; ++n)
+                sums[n] = sums[n] * q + of[n][k];
+        return start[0] * sums[0] + (start[1] * sums[1] + start[2] * sums[2]);
+    }
+};
+
 TwoOrders SeriesK(double mu, Complex z, double modulus, bool hasSecond) {
     double even = 0; // (1 / gamma(1 - mu) + 1 / gamma(1 + mu)) / 2
     double odd = 0;  // (1 / gamma(1 - mu) - 1 / gamma(1 + mu)) / (2 mu)
@@ -385,52 +416,18 @@ TwoOrders SeriesK(double mu, Complex z, double modulus, bool hasSecond) {
     }
     const PowersOfHalf power(mu, z, modulus);
     const double reflected = mu == 0 ? 1 : kPi * mu / SinPi(mu);
-    const Complex f =
+    const Complex start[3] = {
         ((power.grow + power.decay) * (0.5 * odd) + power.sinc * power.logarithm * even) *
-        reflected;
-    // gamma(1 + mu) / 2 and gamma(1 - mu) / 2
-    const Complex p = power.grow * (0.5 / (even - mu * odd));
-    const Complex q = power.decay * (0.5 / (even + mu * odd));
-
-    constexpr int most = 20;
-    double ofF[most] = {1}; // what f_k / k! has of f, p and q
-    double ofP[most] = {0};
-    double ofQ[most] = {0};
-    double pOverP[most] = {1}; // p_k / (k! p)
+            reflected,
+        power.grow * (0.5 / (even - mu * odd)), // gamma(1 + mu) / 2 times the power
+        power.decay * (0.5 / (even + mu * odd))};
     const Complex half = z * 0.5;
     const Complex square = half * half;
-    const double size = Size(square);
-    double qOverQ = 1;
-    double term = 1;
-    int n = 0;
-    while (n + 1 < most && term > kNegligible) {
-        ++n;
-        const double scale = 1 / ((n - mu) * (n + mu)) * inverses.of[n];
-        ofF[n] = n * scale * ofF[n - 1];
-        ofP[n] = scale * (n * ofP[n - 1] + pOverP[n - 1]);
-        ofQ[n] = scale * (n * ofQ[n - 1] + qOverQ);
-        pOverP[n] = pOverP[n - 1] * ((n + mu) * scale);
-        qOverQ *= (n - mu) * scale;
-        term *= size * scale * n;
-    }
-    Complex sumF = {0, 0};
-    Complex sumP = {0, 0};
-    Complex sumQ = {0, 0};
-    for (int k = n; k >= 0; --k) {
-        sumF = sumF * square + ofF[k];
-        sumP = sumP * square + ofP[k];
-        sumQ = sumQ * square + ofQ[k];
-    }
-    const Complex first = f * sumF + (p * sumP + q * sumQ);
-    if (!hasSecond)
-        return {first, {0, 0}, Plain({0, 0})};
-    sumF = sumP = sumQ = {0, 0};
-    for (int k = n; k >= 0; --k) {
-        sumF = sumF * square - Complex{k * ofF[k], 0};
-        sumP = sumP * square + (pOverP[k] - k * ofP[k]);
-        sumQ = sumQ * square - Complex{k * ofQ[k], 0};
-    }
-    return {first, (f * sumF + (p * sumP + q * sumQ)) / half, Plain({0, 0})};
+    const TemmeTerms terms(mu, Size(square));
+    const Complex first = terms.sum(terms.first, start, square);
+    const Complex second =
+        hasSecond ? terms.sum(terms.second, start, square) / half : Complex{0, 0};
+    return {first, second, Plain({0, 0})};
 }
 
 // K_(order + steps) from K_order and K_(order + 1).
@@ -486,7 +483,7 @@ Exponential NearK(double order, Complex z, double modulus) {
         return Upwards(split.mu, split.m, z, HalfOrderK(z));
     return Upwards(split.mu, split.m, z,
                    modulus + z.re <= kSeriesUpTo ? SeriesK(split.mu, z, modulus, split.m > 0)
-                                       : MillerK(split.mu, z, modulus));
+                                                 : MillerK(split.mu, z, modulus));
 }
 
 Exponential UpperK(double order, Complex z) {

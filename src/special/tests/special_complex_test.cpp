@@ -77,7 +77,8 @@ Found Call(const std::string &name, double order, CDB z, bool scaled = false) {
 double Size(CDB z) { return std::hypot(z.re, z.im); }
 
 TEST(SpecialComplex, AgreesWithReferencesOnBothSidesOfEachThreshold) {
-    EXPECT_GT(qx::test::ExpectAgreement(Exports(), qx::test::TestData("special_complex.dat")), 1850);
+    EXPECT_GT(qx::test::ExpectAgreement(Exports(), qx::test::TestData("special_complex.dat")),
+              1850);
 }
 
 TEST(SpecialComplex, ReportsWhatCannotBeComputed) {
