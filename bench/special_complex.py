@@ -25,10 +25,9 @@ COUNT = 5000
 BESSEL = (("J", special.jve), ("Y", special.yve), ("I", special.ive), ("K", special.kve),
           ("H1", special.hankel1e), ("H2", special.hankel2e))
 AIRY = ("QX_CxAiryAi", "QX_CxAiryAiP", "QX_CxAiryBi", "QX_CxAiryBiP")
-# Orders from, to, moduli from, to; the last is about the turning points, |z| within 4 |order|^(1/3)
-# of the order.
 REGIONS = ((0, 0, 0.01, 1), (0, 3, 0.1, 3), (0, 5, 2, 20), (0, 5, 25, 100), (5, 40, 10, 60),
-           (90, 300, 100, 600), (100, 500, 500, 1000), (30, 1000, None, None))
+           (90, 300, 100, 600), (100, 500, 500, 1000))  # orders from, to, moduli from, to
+TURNING = ((10, 22), (22, 60), (60, 200), (200, 1000))  # orders from, to
 AIRY_REGIONS = ((0.1, 1.5), (1.5, 9), (10, 100))
 
 
@@ -52,21 +51,32 @@ def on_rays(random, modulus):
     return modulus * np.exp(1j * random.uniform(-np.pi, np.pi, COUNT))
 
 
+def turning_points(random, order):
+    """z within 4 |order|^(1/3) of the order, next to the real axis."""
+    side = random.choice([0, np.pi], COUNT) + random.normal(0, 0.05, COUNT)
+    return abs(order + random.uniform(-4, 4, COUNT) * np.cbrt(order)) * np.exp(1j * side)
+
+
+def bessel_cases(random):
+    """What a case is called, its orders and its arguments, those of I and K apart."""
+    for low, high, near, far in REGIONS:
+        z = on_rays(random, random.uniform(near, far, COUNT))
+        yield f"order {low} to {high}, |z| {near} to {far}", random.uniform(low, high, COUNT), z, z
+    for low, high in TURNING:
+        order = random.uniform(low, high, COUNT)
+        z = turning_points(random, order)
+        yield f"order {low} to {high}, turning points", order, z, 1j * z
+
+
 def main():
     warnings.simplefilter("ignore")
     random = np.random.default_rng(1)
     ratios = []
-    for low, high, near, far in REGIONS:
-        order = random.uniform(low, high, COUNT)
-        if near is None:
-            size = order + random.uniform(-4, 4, COUNT) * np.cbrt(order)
-        else:
-            size = random.uniform(near, far, COUNT)
-        where = f"|z| {near} to {far}" if near is not None else "|z| near it"
-        z = on_rays(random, size)
+    for where, order, oscillating, modified in bessel_cases(random):
         for name, peer in BESSEL:
+            z = modified if name in "IK" else oscillating
             times = best(lambda: qx.call(f"QX_CxBessel{name}r", order, z, 1), lambda: peer(order, z))
-            ratios.append(shown(f"{name}, order {low} to {high}, {where}", *times))
+            ratios.append(shown(f"{name}, {where}", *times))
     print_summary("complex Bessel functions, called from Python", "SciPy", ratios)
     ratios = []
     for near, far in AIRY_REGIONS:

@@ -10,16 +10,21 @@ namespace qx {
 // the real axis; below, y = |Im z|.
 //
 //   I  |z|^2 <= 4 (v + 1)          the power series, whose terms fall from the start
-//      |z| > 5, Re z <= 1, y > v   K at z and -z, unless an expansion below holds
-//      |z| < 22                    Miller's recurrence, normalised by Neumann's series of exp(z)
-//   K  |z| + Re z <= 3             the power series of N. M. Temme (1975) for two orders next to 0
+//      |z| from 5 to 22, Re z <= 1, y > v, no expansion below: K at z and -z
+//      |z| < 22, v < 10            Miller's recurrence, normalised by Neumann's series of exp(z)
+//   K  |z| + Re z <= 2             the power series of N. M. Temme (1975) for two orders next to 0
 //      |z| < 22                    Miller's recurrence for the confluent function (Temme, 1975)
-//      both then upwards in the order, along which K grows
+//      both then upwards in the order, along which K grows; half orders from their closed form
 //   both, where |z| >= 22 and v^2 <= 2 |z|: Hankel's expansion
 //   both, where |v + i z| >= 8.2 max(|z|, v)^(1/3), and |z| >= 22 or v >= 10: Debye's expansion,
 //      which beyond the Stokes line of the turning point z = i v takes a second exponential for I
 //   both next to the turning point: recurrence from where Debye's holds, which is 8.2 |z|^(1/3)
-//      orders off, downwards for I and upwards for K. Each is the solution that this does not harm.
+//      orders off, downwards for I and upwards for K, below order 25 from next to 0. Each is the
+//      solution that this does not harm.
+//
+// What would cost digits is done in more than double precision: exponents and phases
+// (complex_exponent.h) at orders that are not rounded, the recurrences in the order
+// (order_recurrence.h), and what Miller's loses to the rounding of 2 / z and of the orders.
 //
 // Where |v + i z| = 8.2 max(|z|, v)^(1/3) the difference of the two exponentials' exponents is at
 // least 44, the size at which Debye's first 20 terms leave 2^-55; so they do in Hankel's case.
