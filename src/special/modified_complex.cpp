@@ -146,9 +146,9 @@ Sums HankelSums(double order, Complex z) {
 }
 
 // exp(e) S(u) + i exp(i pi order) exp(-e) S(-u), times a scale over sqrt(2 pi).
-ExponentialPair TwoExponentials(double order, Complex root, const ExtendedComplex &exponent,
+ExponentialPair TwoExponentials(double order, Complex scale, const ExtendedComplex &exponent,
                                 Complex growing, Complex decaying, bool hasSecond) {
-    const Complex scale = root * kInverseRootTwoPi;
+    scale = scale * kInverseRootTwoPi;
     ExponentialPair pair = {{scale * growing, exponent}, {{0, 0}, exponent}};
     if (hasSecond)
         pair.second = {scale * decaying * TimesI(TurnByPi(order)), Negative(exponent)};
