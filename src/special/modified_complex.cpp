@@ -22,7 +22,7 @@ constexpr double kDebyeFrom = 10;     // order, for smaller |z|
 constexpr double kTurningWidth = 8.2; // times max(|z|, order)^(1/3)
 constexpr double kLongWayUp = 25;     // orders that take as long as Debye's expansion
 constexpr double kAxisWidth = 1;      // |Re z| up to which I is taken from K on both sides
-constexpr double kAxisFrom = 5;       // |z| from which it is
+constexpr double kAxisFrom = 3;       // |z| from which it is
 constexpr double kSeriesUpTo = 2;     // |z| + Re z, of Temme's series
 constexpr double kNegligible = 0x1p-56;
 constexpr double kRootHalfPi = 0x1.40d931ff62706p+0;
@@ -306,8 +306,7 @@ Exponential MillerI(double order, Complex z, double modulus) {
     // All that is of z (1 - excess), but for its power and exponential.
     const Complex excess = ExcessOfInverse(z, step * 0.5);
     const Complex slope = z * (next - wanted) + wanted * split.m;
-    return {(wanted + excess * slope) * Inverse(sum) * power * ReciprocalGammaNextToOne(mu),
-            Plain(z)};
+    return {(wanted + excess * slope) * power / sum * ReciprocalGammaNextToOne(mu), Plain(z)};
 }
 
 // K_mu = sqrt(pi / (2 z)) exp(-z) U_0 / sum C_n U_n, where U_n is the confluent function
@@ -327,8 +326,8 @@ TwoOrders MillerK(double mu, Complex z, double modulus) {
         u = below;
         sum = u + sum * (coefficient(n) * (inverses.of[n] * inverses.of[n]));
     }
-    const Complex first = Inverse(RootOfUpperHalf(z)) * kRootHalfPi * u * Inverse(sum);
-    const Complex ratio = (z + (mu + 0.5) - above * Inverse(u) * coefficient(1)) * Inverse(z);
+    const Complex first = u * kRootHalfPi / (sum * RootOfUpperHalf(z));
+    const Complex ratio = (z + (mu + 0.5) - above * coefficient(1) / u) / z;
     return {first, first * ratio, Plain(-z)};
 }
 

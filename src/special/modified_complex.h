@@ -10,7 +10,7 @@ namespace qx {
 // the real axis; below, y = |Im z|.
 //
 //   I  |z|^2 <= 4 (v + 1)          the power series, whose terms fall from the start
-//      |z| from 5 to 22, Re z <= 1, y > v, no expansion below: K at z and -z
+//      |z| from 3 to 22, Re z <= 1, y > v, no expansion below: K at z and -z
 //      |z| < 22, v < 10            Miller's recurrence, normalised by Neumann's series of exp(z)
 //   K  |z| + Re z <= 2             the power series of N. M. Temme (1975) for two orders next to 0
 //      |z| < 22                    Miller's recurrence for the confluent function (Temme, 1975)
