@@ -37,7 +37,8 @@ class WithLibraries(build_py):
         package = Path(self.build_lib) / "qx"
         for name in ("libqxanalysis.so", "libqxrt.so", "catalogue.json"):
             shutil.copy(libraries() / name, package)
-        subprocess.run([sys.executable, "-m", "qx.stubs", package / "__init__.pyi"], check=True,
+        subprocess.run([sys.executable, "-m", "qx.stubs", package / "__init__.pyi",
+                        package / "exports.pyi"], check=True,
                        env={**os.environ, "PYTHONPATH": os.pathsep.join(
                            [self.build_lib, *filter(None, sys.path)]), "QX_LIBRARY_DIR": ""})
 
@@ -56,7 +57,7 @@ class OfThisPlatform(bdist_wheel):
 
 (BUILD / "python").mkdir(parents=True, exist_ok=True)
 setup(version=re.search(r"project\(qxanalysis VERSION (\S+)", PROJECT)[1], distclass=HasLibraries,
-      package_dir={"": "python"}, packages=["qx", "qx.commands"],
+      package_dir={"": "python"}, packages=["qx", "qx.commands", "qx.topical"],
       package_data={"qx": ["py.typed"]},
       cmdclass={"build_py": WithLibraries, "bdist_wheel": OfThisPlatform},
       options={"egg_info": {"egg_base": "build/python"}, "build": {"build_base": "build/python"}})

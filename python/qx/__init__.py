@@ -1,24 +1,35 @@
-"""The analysis library with NumPy arrays.
+"""Numerical analysis of measured and generated signals.
 
     import qx
+    lowpass = qx.filters.butterworth(4, 40, fs=1000)
+    smooth = lowpass.zero_phase(x)
+    help(qx.filters)                        # the functions of a topic
+
+The topics are modules: filters, fft, windows, spectra, signals, noise, multirate, linalg, poly, fit,
+interpolate, calculus, stats, special, measure, coordinates. They stand on the exports of the library,
+which are functions too, in `qx.exports` and under `qx` itself:
+
     qx.Moment_head([1.0, 2.0, 4.0], 2)      # 1.5555555555555554
-    qx.list("variance")                     # the functions whose name or text has the word
+    qx.list("variance")                     # the exports whose name or text has the word
     help(qx.Moment_head)
 
-Every export of the module is a function here. `python3 -m qx` tells the same on the command line.
+`python3 -m qx` has the same on the command line.
 """
 
+import importlib as _importlib
+
 from . import catalogue as _catalogue
-from .calls import NoSuchExport, call, export, hint as _hint
+from .calls import NoSuchExport, call, export
 from .library import NotBuilt, library as _library
-from .outcomes import QxError, QxWarning
+from .outcomes import ArgumentError, MatrixError, OutOfMemory, QxError, QxWarning
 from .plans import release
 from .pointers import Pointer
+from .topical.newest import TOPICS as _TOPICS, answer as _answer
 
 list = _catalogue.find
 
-__all__ = ["NoSuchExport", "NotBuilt", "Pointer", "QxError", "QxWarning", "call", "export", "list",
-           "names", "release"]
+__all__ = ["ArgumentError", "MatrixError", "NoSuchExport", "NotBuilt", "OutOfMemory", "Pointer",
+           "QxError", "QxWarning", "call", "export", "list", "names", "release"]
 
 
 def names():
@@ -29,16 +40,28 @@ def names():
 def __getattr__(name):
     if name == "__version__":
         return _library().catalogue["version"]
+    if name in _TOPICS or name == "exports":
+        return _importlib.import_module(f".{name}", __name__)
     if name.startswith("__"):
         raise AttributeError(name)
     try:
         function = export(name)
     except NoSuchExport:
-        known = [*_library().entries, *__all__]
-        raise AttributeError(f"qx has no function {name}{_hint(name, known)}") from None
+        raise AttributeError(f"qx has no function {name}{_answer(name, __all__)}") from None
     globals()[name] = function
     return function
 
 
+class _First(str):
+    """A name that is sorted before all others by dir()."""
+
+    def __lt__(self, other):
+        return str.__lt__(self, other) if isinstance(other, _First) else True
+
+    def __gt__(self, other):
+        return str.__gt__(self, other) if isinstance(other, _First) else False
+
+
 def __dir__():
-    return [*globals(), *_library().entries]
+    own = [name for name in globals() if name not in _TOPICS]
+    return [*map(_First, _TOPICS), *{*own, "exports", *_library().entries}]

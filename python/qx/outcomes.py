@@ -1,8 +1,12 @@
-"""Failures and warnings of the exports."""
+"""Failures and warnings of the exports and of the topics."""
 
 import os
+import re
 import sys
+import threading
 import warnings
+
+from numpy.linalg import LinAlgError
 
 from .library import library
 
@@ -11,39 +15,109 @@ _PACKAGE = os.path.dirname(os.path.abspath(__file__))
 
 
 class QxError(Exception):
-    """A failure: `code`, `name` and `text` as the host has them, `export`, and `results` with
-    what the export left behind. Most failures leave empty arrays and NaN."""
+    """A failure: `code`, `name` and `text` as the host has them, `export`, `rule` (what the export's
+    text says of this code), and `results` with what the export left behind. Most failures leave empty
+    arrays and NaN. Failures of one kind are of a class that is also Python's or NumPy's for them."""
 
-    def __init__(self, export, code, results=None, place=""):
+    def __init__(self, export, code, results=None, place="", message=None):
         self.export, self.code, self.results, self.place = export, code, results, place
         self.name, self.text = library().error_name(code), library().error_text(code)
-        super().__init__(f"{export}{place}: {self.text} ({self.name}, {code})")
+        self.rule = rule(export, self.name)
+        self._message = message
+        because = f": {self.rule}" if self.rule else ""
+        super().__init__(message or f"{export}{place}: {self.text} ({self.name}, {code}){because}")
 
     def __reduce__(self):
-        return QxError, (self.export, self.code, self.results, self.place)
+        return type(self), (self.export, self.code, self.results, self.place, self._message)
+
+
+class ArgumentError(QxError, ValueError):
+    """An argument, or several together, against a rule of the function."""
+
+
+class MatrixError(QxError, LinAlgError):
+    """A matrix that is singular, not square, not positive definite or too badly conditioned."""
+
+
+class OutOfMemory(QxError, MemoryError):
+    """The host has no memory for a result, or the library none for its work."""
+
+
+_MATRIX = ("ErrSingularMatrix", "ErrNotSquare", "ErrNotPositiveDefinite", "ErrConditionTooHigh")
+_MEMORY = ("ErrOutOfMemory", "ErrMeasureOutOfMemory", "ErrWorkspaceExhausted")
+_OTHERS = ("ErrIterationLimit", "ErrNoUsableFit", "ErrOverflow", "ErrNonFiniteFunction", "ErrInternal",
+           "ErrNotAvailable", "ErrBesselStatusOne", "ErrBesselStatusFour", "ErrMeasureNotFound",
+           "ErrMeasureSearchShort", "ErrMeasureTooFewPoints", "ErrMeasureNullState")
+
+
+def rule(export, name):
+    """What the text of the export, or of the one whose codes it takes over, says of a code."""
+    entry = library().entries.get(export, {"documentation": "", "inherited": []})
+    for text in (entry["documentation"],
+                 *(library().entries[other]["documentation"] for other in entry["inherited"])):
+        codes = " ".join(text.partition("Codes:")[2].split())
+        if found := re.search(rf"\b{name} \(((?:[^()]|\([^()]*\))*)\)", codes):
+            return found[1]
+    return ""
+
+
+def failure(export, code, results=None, place=""):
+    """The exception for a code, of the class that fits it."""
+    name = library().error_name(code)
+    kind = (MatrixError if name in _MATRIX else OutOfMemory if name in _MEMORY or code in HOST_FAILURES
+            else QxError if name in _OTHERS or not name.startswith("Err") else ArgumentError)
+    return kind(export, code, results, place)
 
 
 class QxWarning(UserWarning):
     """A warning: the results stand."""
 
-    def __init__(self, export, code):
+    def __init__(self, export, code, message=None):
         self.export, self.code = export, code
         self.name, self.text = library().error_name(code), library().error_text(code)
-        super().__init__(f"{export}: {self.text} ({self.name}, {code})")
+        self._message = message
+        super().__init__(message or f"{export}: {self.text} ({self.name}, {code})")
 
     def __reduce__(self):
-        return QxWarning, (self.export, self.code)
+        return QxWarning, (self.export, self.code, self._message)
 
 
 def is_failure(status):
     return status < 0 or status in HOST_FAILURES
 
 
+_kept = threading.local()  # the warnings of a thread that works for another one
+
+
 def tell(export, status, results, place=""):
     """Raises a failure; gives a warning at the line that called into the package."""
     if is_failure(status):
-        raise QxError(export, status, results, place)
+        raise failure(export, status, results, place)
+    warn(QxWarning(export, status))
+
+
+def warn(warning):
+    """Gives a warning at the line that called into the package; in a thread that works for another one
+    it is kept for that one."""
+    kept = getattr(_kept, "warnings", None)
+    if kept is not None:
+        kept.append(warning)
+        return
     level, frame = 1, sys._getframe()
     while frame.f_back and (frame.f_code.co_filename.startswith((_PACKAGE, "<qx "))):
         frame, level = frame.f_back, level + 1
-    warnings.warn(QxWarning(export, status), stacklevel=level)
+    warnings.warn(warning, stacklevel=level)
+
+
+def keeping(work, *arguments):
+    """The result of work, done in a thread for another one, and the warnings that it gave."""
+    _kept.warnings = []
+    try:
+        return work(*arguments), _kept.warnings
+    finally:
+        _kept.warnings = None
+
+
+def works_for_another():
+    """Whether this thread is one of those that keep their warnings."""
+    return getattr(_kept, "warnings", None) is not None

@@ -1,4 +1,5 @@
-"""Writes the stub file of the package, for type checkers and editors: python3 -m qx.stubs FILE."""
+"""Writes the stub files, for type checkers and editors: python3 -m qx.stubs FILE [EXPORTS], of the package
+and of qx.exports."""
 
 import re
 import sys
@@ -6,6 +7,7 @@ from pathlib import Path
 
 from .functions import documentation, parameters, returned
 from .library import library
+from .topical.newest import TOPICS
 
 HEAD = '''"""The exports as functions. Written by qx.stubs from the catalogue."""
 
@@ -16,10 +18,12 @@ from typing import Any
 import numpy as np
 from numpy.typing import ArrayLike, NDArray
 
+from . import exports as exports, {topics}
 from .calls import NoSuchExport as NoSuchExport, call as call
 from .catalogue import Found
 from .library import NotBuilt as NotBuilt
-from .outcomes import QxError as QxError, QxWarning as QxWarning
+from .outcomes import ArgumentError as ArgumentError, MatrixError as MatrixError, \\
+    OutOfMemory as OutOfMemory, QxError as QxError, QxWarning as QxWarning
 from .plans import release as release
 from .pointers import Pointer as Pointer
 
@@ -28,6 +32,17 @@ __version__: str
 def export(name: str) -> Callable[..., Any]: ...
 def list(pattern: str = "*") -> Found: ...
 def names() -> _list[str]: ...
+'''
+
+EXPORTS_HEAD = '''"""Every export as a function. Written by qx.stubs from the catalogue."""
+
+from collections.abc import Mapping
+from typing import Any
+
+import numpy as np
+from numpy.typing import ArrayLike, NDArray
+
+from .pointers import Pointer
 '''
 
 
@@ -40,8 +55,14 @@ def stub(entry):
 
 
 def text():
-    return "\n\n".join([HEAD, *map(stub, library().catalogue["exports"])])
+    topics = ", ".join(f"{topic} as {topic}" for topic in TOPICS)
+    return "\n\n".join([HEAD.replace("{topics}", topics), *map(stub, library().catalogue["exports"])])
+
+
+def text_of_exports():
+    return "\n\n".join([EXPORTS_HEAD, *map(stub, library().catalogue["exports"])])
 
 
 if __name__ == "__main__":
-    Path(sys.argv[1]).write_text(text(), "utf-8")
+    for path, written in zip(sys.argv[1:], (text, text_of_exports)):
+        Path(path).write_text(written(), "utf-8")

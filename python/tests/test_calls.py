@@ -22,7 +22,7 @@ import numpy as np
 PYTHON = Path(__file__).resolve().parent.parent
 sys.path.insert(0, str(PYTHON))
 import qx  # noqa: E402
-from qx import arrays, functions, plans, stubs  # noqa: E402
+from qx import arrays, functions, outcomes, plans, stubs  # noqa: E402
 from qx.library import library  # noqa: E402
 
 
@@ -193,7 +193,19 @@ class Outcomes(unittest.TestCase):
                 1, multiprocessing.get_context("spawn")) as processes:
             self.assertEqual(processes.submit(qx.Mean_head, [1.0, 3.0]).result(), 2.0)
             failed = processes.submit(qx.Mean_head, []).exception()
-        self.assertEqual((type(failed), failed.name), (qx.QxError, "ErrEmptyInput"))
+        self.assertEqual((type(failed), failed.name), (qx.ArgumentError, "ErrEmptyInput"))
+
+    def test_failures_are_of_pythons_and_numpys_kinds(self):
+        for kind, call in ((ValueError, lambda: qx.Mean_head([])),
+                           (np.linalg.LinAlgError, lambda: qx.InvMatrixLUDri_head([[1.0, 2.0], [2.0, 4.0]])),
+                           (MemoryError, lambda: outcomes.tell("Mean_head", -20001, {}))):
+            with self.subTest(kind=kind):
+                with self.assertRaises(kind) as caught:
+                    call()
+                self.assertIsInstance(caught.exception, qx.QxError)
+        with self.assertRaisesRegex(qx.QxError, r"ErrBadCutoff, -20023\): a frequency is not above 0") as caught:
+            qx.BWCoefs90(1000, -1, 0, 4, 0, 0)
+        self.assertRegex(caught.exception.rule, "^a frequency is not above 0, or fl is not below fh;")
 
     def test_every_code_has_its_name_and_its_own_text(self):
         codes = {n: c for n, c in library().catalogue["codes"].items() if c != 0}

@@ -1,0 +1,980 @@
+r"""Filters as objects: designed by name, applied to arrays of any dimension, forwards, in both directions
+or block by block.
+
+    lowpass = qx.filters.butterworth(4, 40, fs=1000)
+    y = lowpass(x)                     # along the last axis
+    y = lowpass.zero_phase(x)          # without delay, the ends extended
+    stream = lowpass.stream()          # y = stream(block), as often as there are blocks
+
+Frequencies are in the unit of the sampling rate `fs`; with its default 1.0 in cycles per sample.
+"""
+
+import math
+
+import numpy as np
+
+from .topical import (LAST, Result, Stream, along, chosen, count_of, either, refuse, result, served, vector,
+                      whole_number)
+
+__all__ = ["Filter", "FilterStream", "Response", "bessel", "butterworth", "chebyshev1", "chebyshev2",
+           "elliptic", "equiripple", "from_ba", "from_sos", "median", "savgol", "windowed"]
+
+core = served("filters")
+
+KINDS = {"lowpass": 0, "highpass": 1, "bandpass": 2, "bandstop": 3}
+EXTENSIONS = {"odd": "odd", "even": "even", "constant": "constant", "none": None}
+RINGING = 1e-10  # what is left of the memory of a filter where an extension begins
+EMPTY = np.empty(0)
+
+
+@result
+class Response(Result):
+    """What a filter does to frequencies. Unpacked it is frequencies and values, as of
+    `scipy.signal.freqz`.
+
+    Attributes
+    ----------
+    frequencies : ndarray
+        In the unit of fs.
+    values : ndarray of complex
+        The gain :math:`H(e^{i\\omega})`.
+    delay : ndarray
+        The group delay in samples; NaN where the gain is 0.
+    """
+
+    frequencies: np.ndarray
+    values: np.ndarray
+    delay: np.ndarray
+    _unpacked = ("frequencies", "values")
+
+    @property
+    def magnitude(self):
+        """The absolute value of the gain."""
+        return np.abs(self.values)
+
+    @property
+    def decibels(self):
+        """The gain in decibels, 20 lg of the magnitude."""
+        with np.errstate(divide="ignore"):
+            return 20 * np.log10(self.magnitude)
+
+    @property
+    def phase(self):
+        """The phase in radians, without jumps."""
+        return np.unwrap(np.angle(self.values))
+
+
+class Filter:
+    r"""A linear filter: second-order sections one after the other, or one quotient.
+
+    .. math:: H(z) = \prod_s \frac{b_{s0} + b_{s1} z^{-1} + b_{s2} z^{-2}}
+                                   {1 + a_{s1} z^{-1} + a_{s2} z^{-2}}
+              \quad\text{or}\quad \frac{\sum_j b_j z^{-j}}{\sum_j a_j z^{-j}}
+
+    Made by the functions of this module, `from_sos` and `from_ba`. It is never changed, and can be
+    pickled.
+
+    Examples
+    --------
+    >>> import qx
+    >>> f = qx.filters.butterworth(2, 100, fs=1000)
+    >>> f
+    Filter: butterworth lowpass of order 2, cutoff 100, fs 1000; 1 section
+    >>> f([1.0, 1.0, 1.0, 1.0]).round(4)
+    array([0.0675, 0.2795, 0.5614, 0.7961])
+    """
+
+    def __init__(self, b, a, is_cascade, fs=1.0, title="", main=None):
+        self._b, self._a = np.asarray(b, float), np.asarray(a, float)
+        self._b.flags.writeable = self._a.flags.writeable = False
+        self._is_cascade, self.fs, self.title = is_cascade, float(fs), title
+        self._main = main  # a frequency of the pass band, in cycles per sample
+
+    # Applying
+
+    def __call__(self, x, axis=LAST):
+        """The filtered signal.
+
+        Parameters
+        ----------
+        x : array_like
+            Real or complex samples, of any dimension; complex ones run through as two real signals.
+        axis : int
+            The axis of time; of a pandas table the rows.
+
+        Returns
+        -------
+        ndarray, or what x is of pandas
+            Of the shape of x.
+
+        Raises
+        ------
+        ValueError
+            If x is empty.
+        """
+        return either(self._run, self._run_complex, x, axis)
+
+    def _run(self, x):
+        if self._is_cascade:
+            return core.Filter_cascade(x, 0, self._a, self._b, EMPTY, 0)[0]
+        return core.Filter_direct(x, self._a, self._b, EMPTY, EMPTY, 0)[0]
+
+    def _run_complex(self, x):
+        if self._is_cascade:
+            return core.Filter_cascade_complex(x, 0, self._a, self._b, EMPTY, 0)[0]
+        return core.Filter_direct_complex(x, self._a, self._b, EMPTY, EMPTY, 0)[0]
+
+    def zero_phase(self, x, axis=LAST, extension="odd", pad=None):
+        r"""The signal filtered forwards and backwards: no delay, the magnitude squared.
+
+        Before and behind the signal it is extended, and the memory of the filter begins as if the first
+        value had always been there, so that an offset or a ramp comes out as it went in, where the
+        filter lets it pass.
+
+        Parameters
+        ----------
+        x : array_like
+            Real or complex samples, of any dimension.
+        axis : int
+            The axis of time.
+        extension : {"odd", "even", "constant", "none"}
+            What is put at the ends: the signal turned about its end point, :math:`2 x_0 - x_j`; its
+            mirror image; the end point; nothing.
+        pad : int, optional
+            How many values; as long as the filter rings by default, and at most one less than there are.
+
+        Returns
+        -------
+        ndarray, or what x is of pandas
+            Of the shape of x.
+
+        Raises
+        ------
+        ValueError
+            If x is empty, pad is not below its length, or extension is none of its words.
+
+        Examples
+        --------
+        >>> import numpy as np, qx
+        >>> ramp = np.arange(100.0)
+        >>> f = qx.filters.butterworth(2, 0.1)
+        >>> bool(np.allclose(f.zero_phase(ramp), ramp))
+        True
+        """
+        kind = chosen("filters.Filter.zero_phase", "extension", extension, EXTENSIONS)
+        n = count_of(x, axis)
+        if kind is None or n < 2:
+            pad = 0
+        elif pad is None:
+            pad = min(self._ringing(), n - 1)
+        elif not 0 <= pad < n:
+            refuse("filters.Filter.zero_phase", "pad", f"must be from 0 to {n - 1}, one less than there "
+                   f"are values; {pad} came", "ErrSizesDisagree")
+        return along(lambda channel: self._both_ways(channel, kind, pad), x, axis)
+
+    def _both_ways(self, x, kind, pad):
+        long = np.pad(x, pad, "edge") if kind == "constant" else \
+            np.pad(x, pad, "reflect", reflect_type=kind) if kind else x
+        there = self._from_rest(long)
+        back = self._from_rest(there[::-1])
+        return back[::-1][pad:pad + len(x)]
+
+    def _from_rest(self, x):
+        """Filtered as if the first value had always been there."""
+        x = np.ascontiguousarray(x)
+        return FilterStream(self, dtype=complex if x.dtype.kind == "c" else float, value=x[0])(x) \
+            if len(x) else self(x)
+
+    def _ringing(self):
+        """Samples until the impulse response has fallen to RINGING, by the largest pole."""
+        if not self.is_iir:
+            return 3 * len(self._b)
+        largest = float(np.abs(self.poles).max(initial=0))
+        if largest >= 1:
+            return 3 * len(self._b)
+        rings = math.ceil(math.log(RINGING) / math.log(largest)) if largest > 0 else 0
+        return max(rings, 3 * (len(self._b) + 1))
+
+    def stream(self, channels=None, axis=-1, dtype=float):
+        """The filter for blocks: all blocks together give the bits of `self(x)`.
+
+        Parameters
+        ----------
+        channels : int, optional
+            How many channels a block of two dimensions has; without it blocks have one dimension.
+        axis : int
+            The axis of time in a block of two dimensions.
+        dtype : {float, complex}
+            Of the samples.
+
+        Returns
+        -------
+        FilterStream
+
+        Examples
+        --------
+        >>> import numpy as np, qx
+        >>> f = qx.filters.butterworth(4, 0.1)
+        >>> stream, x = f.stream(), np.ones(100)
+        >>> bool(np.all(np.r_[stream(x[:7]), stream(x[7:])] == f(x)))
+        True
+        """
+        return FilterStream(self, channels, axis, dtype)
+
+    # What it is
+
+    @property
+    def is_iir(self):
+        """Whether it has a feedback."""
+        return bool(len(self._a) > (0 if self._is_cascade else 1) and np.any(self._a[not self._is_cascade:]))
+
+    @property
+    def sos(self):
+        """The second-order sections, one to a row: b0, b1, b2, 1, a1, a2, as of SciPy."""
+        if self._is_cascade:
+            b, a = self._b.reshape(-1, 3), self._a.reshape(-1, 2)
+            return np.hstack([b, np.ones((len(b), 1)), a])
+        if max(len(self._b), len(self._a)) > 3:
+            refuse("filters.Filter.sos", "self", "a quotient of a higher order than 2 has no sections "
+                   "here; poles and zeros has it", "ErrCoefficientSizes")
+        a = np.r_[self._a, np.zeros(3 - len(self._a))] if len(self._a) else np.array([1.0, 0, 0])
+        return np.r_[np.r_[self._b, np.zeros(3 - len(self._b))], a][None] / a[0]
+
+    @property
+    def ba(self):
+        """Numerator and denominator in ascending powers of 1/z. Of a high order they lose digits;
+        `sos` does not."""
+        if not self._is_cascade:
+            return self._b.copy(), self._a.copy() if len(self._a) else np.ones(1)
+        b, a = np.ones(1), np.ones(1)
+        for row in self.sos:
+            b, a = np.convolve(b, row[:3]), np.convolve(a, row[3:])
+        return b, a
+
+    @property
+    def taps(self):
+        """The impulse response of a filter without feedback."""
+        if self.is_iir:
+            refuse("filters.Filter.taps", "self", "a filter with feedback has no end of taps",
+                   "ErrBadCoefficients")
+        return self.ba[0]
+
+    def _pairs(self):
+        """Numerators and denominators of the factors."""
+        if self._is_cascade:
+            return [(row[:3], row[3:]) for row in self.sos]
+        return [self.ba]
+
+    def _roots(self, which):
+        found = []
+        for pair in self._pairs():
+            # A polynomial in 1/z: the same number of powers in both, and the highest power of z first.
+            pair = [np.trim_zeros(one, "b") for one in pair]
+            size = max(map(len, pair))
+            coefficients = np.r_[pair[which], np.zeros(size - len(pair[which]))]
+            found.append(_roots(coefficients))
+        return np.concatenate([*found, np.empty(0, complex)])
+
+    @property
+    def poles(self):
+        """The poles in the z plane; a filter without feedback has them all at 0."""
+        return self._roots(1)
+
+    @property
+    def zeros(self):
+        """The zeros in the z plane."""
+        return self._roots(0)
+
+    @property
+    def is_stable(self):
+        """Whether all poles are inside the unit circle."""
+        return bool(np.all(np.abs(self.poles) < 1))
+
+    @property
+    def delay(self):
+        """The group delay in samples: the one of all frequencies where the taps are symmetric, else that
+        in the middle of the pass band. `response().delay` has it for each frequency."""
+        if not self.is_iir:
+            h = self.taps
+            if np.array_equal(h, h[::-1]) or np.array_equal(h, -h[::-1]):
+                return (len(h) - 1) / 2
+        main = self._main
+        if main is None:
+            coarse = self.response(1024)
+            main = coarse.frequencies[np.argmax(coarse.magnitude)] / self.fs
+        return float(self.response(np.array([main]), 1.0).delay[0])
+
+    def response(self, frequencies=512, fs=None):
+        """Gain, phase and group delay.
+
+        Parameters
+        ----------
+        frequencies : int or array_like
+            How many, evenly spaced from 0 to below fs / 2; or which ones, in the unit of fs.
+        fs : float, optional
+            The sampling rate; that of the design by default.
+
+        Returns
+        -------
+        Response
+
+        Examples
+        --------
+        >>> import qx
+        >>> f = qx.filters.butterworth(4, 40, fs=1000)
+        >>> f.response([0, 40, 80]).decibels.round(2)
+        array([  0.  ,  -3.01, -24.66])
+        """
+        fs = self.fs if fs is None else float(fs)
+        if np.ndim(frequencies) == 0:
+            n = whole_number("filters.Filter.response", "frequencies", frequencies, 1)
+            frequencies = np.arange(n) * (fs / 2 / n)
+        frequencies = np.asarray(frequencies, float)
+        z = np.exp(-2j * np.pi * frequencies.ravel() / fs)
+        values, delay = np.ones(z.size, complex), np.zeros(z.size)
+        with np.errstate(divide="ignore", invalid="ignore"):
+            for b, a in self._pairs():
+                above, below = _polynomial(b, z), _polynomial(a, z)
+                values *= above / below
+                delay += (_polynomial(b * np.arange(len(b)), z) / above
+                          - _polynomial(a * np.arange(len(a)), z) / below).real
+        delay[np.abs(values) < 1e-12] = np.nan
+        return Response(frequencies, values.reshape(frequencies.shape), delay.reshape(frequencies.shape))
+
+    def plot(self, axes=None, frequencies=2048):
+        """Draws the gain in decibels over the frequency with matplotlib.
+
+        Parameters
+        ----------
+        axes : matplotlib Axes, optional
+            Where to draw; new ones by default.
+        frequencies : int or array_like
+            As of `response`.
+
+        Returns
+        -------
+        matplotlib Axes
+        """
+        if axes is None:
+            from matplotlib import pyplot
+            axes = pyplot.subplots()[1]
+        shown = self.response(frequencies)
+        axes.plot(shown.frequencies, np.maximum(shown.decibels, -300))
+        axes.set(xlabel="frequency" if self.fs != 1 else "frequency (cycles per sample)",
+                 ylabel="gain (dB)", title=self.title)
+        axes.grid(True, alpha=0.3)
+        return axes
+
+    def __mul__(self, other):
+        """Both filters one after the other."""
+        if not isinstance(other, Filter):
+            return NotImplemented
+        return from_sos(np.vstack([self.sos, other.sos]), self.fs)
+
+    def __repr__(self):
+        if self._is_cascade:
+            count = len(self._b) // 3
+            size = f"{count} section{'s' * (count != 1)}"
+        elif self.is_iir:
+            size = f"{len(self._b)} and {len(self._a)} coefficients"
+        else:
+            size = f"{len(self._b)} taps"
+        return f"Filter: {self.title + '; ' if self.title else ''}{size}"
+
+    def _repr_html_(self):
+        rows = "".join("<tr>" + "".join(f"<td>{value:.10g}</td>" for value in row) + "</tr>"
+                       for row in self.sos) if self._is_cascade else ""
+        head = "".join(f"<th>{name}</th>" for name in ("b0", "b1", "b2", "a0", "a1", "a2"))
+        table = f"<table><tr>{head}</tr>{rows}</table>" if rows else ""
+        return f"<p>{self!r}</p>{table}"
+
+
+def _polynomial(coefficients, z):
+    """Ascending powers."""
+    if len(coefficients) < 8:
+        return np.polynomial.polynomial.polyval(z, coefficients)
+    return core.Filter_polynomial(np.asarray(coefficients, complex), np.asarray(z, complex))
+
+
+def _roots(descending):
+    """Of a polynomial, highest power first: eigenvalues of the companion matrix, and 0 for each
+    coefficient of 0 at the end; coefficients of 0 at the beginning do not count."""
+    kept = np.trim_zeros(descending)
+    degree = len(kept) - 1
+    at_zero = len(descending) - len(np.trim_zeros(descending, "b")) if degree >= 0 else 0
+    if degree < 1:
+        return np.zeros(at_zero, complex)
+    companion = np.eye(degree, k=-1)
+    companion[0] = -kept[1:] / kept[0]
+    return np.r_[core.Filter_roots(companion, 0)[0], np.zeros(at_zero)]
+
+
+class FilterStream(Stream):
+    """A filter for blocks; made by `Filter.stream`.
+
+    Called with blocks of any size; `reset()`, `copy()`, `finish()`; can be pickled in the middle of a
+    signal.
+    """
+
+    def __init__(self, filter_, channels=None, axis=-1, dtype=float, value=0.0):
+        self.filter, self._value = filter_, value
+        super().__init__(channels, axis, dtype)
+
+    def _start(self):
+        """The memory as if `value` had always been there: zeros for 0, and where there is no rest."""
+        f, value = self.filter, self._value
+        if not f._is_cascade:
+            b, a = f.ba
+            gain = b.sum() / a.sum() if value and a.sum() else 0.0
+            feedback = len(f._a) - 1 if len(f._a) else 0
+            return (np.full(max(len(b) - 1, 0), value, self.dtype),
+                    np.full(feedback, value * gain, self.dtype))
+        state = []
+        for row in f.sos if value else ():
+            total = row[3:].sum()
+            inner = value / total if total else 0.0
+            state += [inner, inner]
+            value = inner * row[:3].sum()
+        return np.array(state or np.zeros(2 * (len(f._b) // 3)), self.dtype)
+
+    def _step(self, state, block):
+        f, is_complex = self.filter, self.dtype.kind == "c"
+        if f._is_cascade:
+            run = core.Filter_cascade_complex if is_complex else core.Filter_cascade
+            return run(block, 0, f._a, f._b, state, 1)
+        run = core.Filter_direct_complex if is_complex else core.Filter_direct
+        found, *states = run(block, f._a, f._b, *state, 1)
+        return found, states
+
+
+# Design
+
+def _edges(function, kind, cutoff, fs):
+    """The code of the kind, and fl and fh, in the words that they were given in."""
+    code = chosen(function, "kind", kind, KINDS)
+    edges = np.atleast_1d(np.asarray(cutoff, float))
+    needed = 1 if code < 2 else 2
+    if edges.shape != (needed,):
+        refuse(function, "cutoff", f"a {kind} needs {'one frequency' if needed == 1 else 'two'}; "
+               f"{cutoff!r} came" + "; name the kind for a band" * (code == 0), "ErrSizesDisagree")
+    if not np.all(np.isfinite(edges)) or not fs > 0:
+        refuse(function, "cutoff, fs", "must be finite, and fs above 0", "ErrBadCutoff")
+    if np.any(edges <= 0) or np.any(edges >= fs / 2):
+        refuse(function, "cutoff", f"must be between 0 and half the sampling rate, {fs / 2:g}; {cutoff!r} "
+               "came" + "; give fs for frequencies in its unit" * (fs == 1),
+               "ErrAboveNyquist" if np.any(edges > fs / 2) else "ErrBadCutoff")
+    if needed == 2 and not edges[0] < edges[1]:
+        refuse(function, "cutoff", f"must rise; {cutoff!r} came", "ErrBadCutoff")
+    return code, float(edges[0]), float(edges[-1])
+
+
+def _main(code, fl, fh, fs):
+    """A frequency of the pass band in cycles per sample."""
+    return (0.0, 0.5 - 1e-9, math.sqrt(fl * fh) / fs, 0.0)[code]
+
+
+def _iir(name, order, levels, cutoff, kind, fs):
+    function = f"filters.{name}"
+    order = whole_number(function, "order", order, 1, "ErrOrderNotPositive")
+    code, fl, fh = _edges(function, kind, cutoff, fs)
+    for argument, level in levels.items():
+        if not level > 0:
+            refuse(function, argument, f"must be above 0 dB; {level} came",
+                   "ErrRippleNotPositive" if argument == "ripple" else "ErrAttenuationNotPositive")
+    if len(levels) == 2 and not levels["ripple"] < levels["attenuation"]:
+        refuse(function, "ripple", "must be below the attenuation", "ErrRippleAboveAttenuation")
+    a, b = getattr(core, name)(fs, fl, fh, *levels.values(), order, code, 0)
+    shown = f"{fl:g}" if code < 2 else f"{fl:g} to {fh:g}"
+    return Filter(b, a, True, fs, f"{name} {kind} of order {order}, cutoff {shown}, fs {fs:g}",
+                  _main(code, fl, fh, fs))
+
+
+def butterworth(order, cutoff, kind="lowpass", fs=1.0):
+    r"""A Butterworth filter: maximally flat, 3 dB down at the cutoff.
+
+    .. math:: |H|^2 = \frac{1}{1 + \Omega^{2n}}
+
+    Parameters
+    ----------
+    order : int
+        The order n of the prototype; a band filter has twice as many poles.
+    cutoff : float or (float, float)
+        The edge, or the two edges of a band, in the unit of fs.
+    kind : {"lowpass", "highpass", "bandpass", "bandstop"}
+        What passes.
+    fs : float
+        The sampling rate.
+
+    Returns
+    -------
+    Filter
+
+    Raises
+    ------
+    ValueError
+        If the order is below 1, an edge is not between 0 and fs / 2, or kind is none of its words.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.filters.butterworth(4, (48, 52), "bandstop", fs=1000)
+    Filter: butterworth bandstop of order 4, cutoff 48 to 52, fs 1000; 4 sections
+    """
+    return _iir("butterworth", order, {}, cutoff, kind, fs)
+
+
+def chebyshev1(order, ripple, cutoff, kind="lowpass", fs=1.0):
+    r"""A Chebyshev filter with equal ripples in the pass band.
+
+    .. math:: |H|^2 = \frac{1}{1 + \varepsilon^2 T_n(\Omega)^2},\quad \varepsilon^2 = 10^{r/10} - 1
+
+    Parameters
+    ----------
+    order : int
+        The order n of the prototype.
+    ripple : float
+        How far the gain falls in the pass band, in dB; at the cutoff it is down by as much.
+    cutoff : float or (float, float)
+        The edge, or the two edges of a band, in the unit of fs.
+    kind : {"lowpass", "highpass", "bandpass", "bandstop"}
+        What passes.
+    fs : float
+        The sampling rate.
+
+    Returns
+    -------
+    Filter
+
+    Raises
+    ------
+    ValueError
+        If the order is below 1, the ripple is not above 0, an edge is not between 0 and fs / 2, or kind
+        is none of its words.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.filters.chebyshev1(5, 0.5, 100, fs=1000).response([100]).decibels.round(6)
+    array([-0.5])
+    """
+    return _iir("chebyshev1", order, {"ripple": float(ripple)}, cutoff, kind, fs)
+
+
+def chebyshev2(order, attenuation, cutoff, kind="lowpass", fs=1.0):
+    r"""An inverse Chebyshev filter: flat in the pass band, with equal ripples in the stop band.
+
+    .. math:: |H|^2 = \frac{1}{1 + 1 / (\varepsilon^2 T_n(1/\Omega)^2)},\quad
+              \varepsilon^2 = \frac{1}{10^{a/10} - 1}
+
+    Parameters
+    ----------
+    order : int
+        The order n of the prototype.
+    attenuation : float
+        How far the gain is down in the stop band at least, in dB.
+    cutoff : float or (float, float)
+        The edge of the stop band, or its two edges, in the unit of fs.
+    kind : {"lowpass", "highpass", "bandpass", "bandstop"}
+        What passes.
+    fs : float
+        The sampling rate.
+
+    Returns
+    -------
+    Filter
+
+    Raises
+    ------
+    ValueError
+        If the order is below 1, the attenuation is not above 0, an edge is not between 0 and fs / 2, or
+        kind is none of its words.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.filters.chebyshev2(5, 60, 100, fs=1000).response([100]).decibels.round(6)
+    array([-60.])
+    """
+    return _iir("chebyshev2", order, {"attenuation": float(attenuation)}, cutoff, kind, fs)
+
+
+def elliptic(order, ripple, attenuation, cutoff, kind="lowpass", fs=1.0):
+    r"""An elliptic filter: equal ripples in both bands, and the narrowest transition.
+
+    .. math:: |H|^2 = \frac{1}{1 + \varepsilon^2 R_n(\Omega)^2}
+
+    Parameters
+    ----------
+    order : int
+        The order n of the prototype.
+    ripple : float
+        How far the gain falls in the pass band, in dB.
+    attenuation : float
+        How far the gain is down in the stop band at least, in dB.
+    cutoff : float or (float, float)
+        The edge of the pass band, or its two edges, in the unit of fs.
+    kind : {"lowpass", "highpass", "bandpass", "bandstop"}
+        What passes.
+    fs : float
+        The sampling rate.
+
+    Returns
+    -------
+    Filter
+
+    Raises
+    ------
+    ValueError
+        If the order is below 1, ripple or attenuation is not above 0, the ripple is not below the
+        attenuation, an edge is not between 0 and fs / 2, or kind is none of its words.
+
+    Examples
+    --------
+    >>> import qx
+    >>> f = qx.filters.elliptic(6, 0.1, 80, (48, 52), "bandstop", fs=1000)
+    >>> bool(f.response([50]).decibels[0] < -79.9)
+    True
+    """
+    return _iir("elliptic", order, {"ripple": float(ripple), "attenuation": float(attenuation)}, cutoff,
+                kind, fs)
+
+
+def bessel(order, cutoff, kind="lowpass", fs=1.0):
+    r"""A Bessel filter: the flattest group delay, 3 dB down at the cutoff.
+
+    .. math:: |H|^2 = \frac{B_n(0)^2}{|B_n(i\Omega)|^2}
+
+    with the reverse Bessel polynomial :math:`B_n`. The bilinear transform bends the delay near fs / 2.
+
+    Parameters
+    ----------
+    order : int
+        The order n of the prototype, up to 150.
+    cutoff : float or (float, float)
+        The edge, or the two edges of a band, in the unit of fs.
+    kind : {"lowpass", "highpass", "bandpass", "bandstop"}
+        What passes.
+    fs : float
+        The sampling rate.
+
+    Returns
+    -------
+    Filter
+
+    Raises
+    ------
+    ValueError
+        If the order is below 1 or too high, an edge is not between 0 and fs / 2, or kind is none of its
+        words.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.filters.bessel(4, 40, fs=1000).response([40]).decibels.round(2)
+    array([-3.01])
+    """
+    return _iir("bessel", order, {}, cutoff, kind, fs)
+
+
+def windowed(taps, cutoff, kind="lowpass", window="hamming", fs=1.0, scale=True):
+    r"""A filter of linear phase: the ideal response cut off under a window.
+
+    .. math:: h_i = w_i \frac{\sin(\omega_c (i - c))}{\pi (i - c)},\quad c = \frac{N - 1}{2}
+
+    for the lowpass, and differences of such for the others.
+
+    Parameters
+    ----------
+    taps : int
+        The length N; odd for a highpass or a bandstop.
+    cutoff : float or (float, float)
+        The edge, or the two edges of a band, in the unit of fs; the gain is a half there.
+    kind : {"lowpass", "highpass", "bandpass", "bandstop"}
+        What passes.
+    window : str, tuple or array_like
+        A window of `qx.windows.get`: its name, name and parameter, or its values.
+    fs : float
+        The sampling rate.
+    scale : bool
+        Whether the gain is made 1 in the middle of the pass band (at 0, fs / 2 or between the edges).
+
+    Returns
+    -------
+    Filter
+
+    Raises
+    ------
+    ValueError
+        If taps is below 1, or even for a highpass or a bandstop, an edge is not between 0 and fs / 2, or
+        kind or window is none of its words.
+
+    Examples
+    --------
+    >>> import qx
+    >>> f = qx.filters.windowed(101, 40, fs=1000)
+    >>> f.delay, f.response([0, 40]).magnitude.round(3)
+    (50.0, array([1. , 0.5]))
+    """
+    from . import windows
+    name = "filters.windowed"
+    taps = whole_number(name, "taps", taps, 1, "ErrOrderNotPositive")
+    code, fl, fh = _edges(name, kind, cutoff, fs)
+    if code in (1, 3) and taps % 2 == 0:
+        refuse(name, "taps", f"a {kind} needs an odd number, since its gain at fs / 2 is 0 with an even "
+               f"one; {taps} came", "ErrBadTapCount")
+    h = core.windowed(fs, fl, fh, taps, code)[0] * windows.get(window, taps, symmetric=True)
+    middle = (0.0, 0.5, (fl + fh) / 2 / fs, 0.0)[code]
+    if scale:
+        h = h / np.sum(h * np.cos(2 * np.pi * middle * (np.arange(taps) - (taps - 1) / 2)))
+    shown = f"{fl:g}" if code < 2 else f"{fl:g} to {fh:g}"
+    return Filter(h, EMPTY, False, fs, f"windowed {kind}, cutoff {shown}, fs {fs:g}", middle)
+
+
+def equiripple(taps, bands, desired, weight=None, kind="symmetric", fs=1.0):
+    """The filter of linear phase with the least weighted deviation from what is desired in bands.
+
+    After McClellan, Parks and Rabiner, "A computer program for designing optimum FIR linear phase digital
+    filters", 1973.
+
+    Parameters
+    ----------
+    taps : int
+        The length.
+    bands : array_like
+        The edges of the bands, two for each, rising, in the unit of fs.
+    desired : array_like
+        The gain of each band; of a differentiator the slope, gain by cycles per sample.
+    weight : array_like, optional
+        How much a deviation counts in each band; 1 by default.
+    kind : {"symmetric", "differentiator", "hilbert"}
+        Symmetric taps, or antisymmetric ones for a differentiator or a Hilbert transformer.
+    fs : float
+        The sampling rate.
+
+    Returns
+    -------
+    Filter
+        With the greatest weighted deviation on the grid as `ripple`.
+
+    Raises
+    ------
+    ValueError
+        If taps is below 3, the edges do not rise from 0 to fs / 2 or are not two for each gain, a weight
+        is not above 0, taps is even with a gain at fs / 2, or the exchange does not settle.
+
+    Examples
+    --------
+    >>> import qx
+    >>> f = qx.filters.equiripple(51, [0, 40, 60, 500], [1, 0], fs=1000)
+    >>> bool(f.response([20]).magnitude[0] - 1 <= f.ripple)
+    True
+    """
+    name = "filters.equiripple"
+    taps = whole_number(name, "taps", taps, 1, "ErrOrderNotPositive")
+    code = chosen(name, "kind", kind, {"symmetric": 0, "differentiator": 1, "hilbert": 2})
+    edges, gains = np.ravel(np.asarray(bands, float)), np.atleast_1d(np.asarray(desired, float))
+    weights = np.ones(len(gains)) if weight is None else np.atleast_1d(np.asarray(weight, float))
+    if len(edges) != 2 * len(gains) or len(weights) != len(gains):
+        refuse(name, "bands, desired, weight", f"each band has two edges, a gain and a weight; {len(edges)}, "
+               f"{len(gains)} and {len(weights)} came", "ErrSizesDisagree")
+    if np.any(np.diff(edges) < 0) or edges[0] < 0 or edges[-1] > fs / 2:
+        refuse(name, "bands", f"the edges must rise from 0 to half the sampling rate, {fs / 2:g}; {bands!r} "
+               "came", "ErrAboveNyquist" if edges[-1] > fs / 2 else "ErrBadCutoff")
+    if code == 0 and taps % 2 == 0 and edges[-1] == fs / 2 and gains[-1]:
+        refuse(name, "taps", f"must be odd with a gain at fs / 2; {taps} came", "ErrBadTapCount")
+    rows = [tuple(row) for row in np.column_stack([gains, edges[::2], edges[1::2], weights])]
+    h, ripple = core.equiripple(taps, fs, rows, code, 0)
+    best = int(np.argmax(np.abs(gains)))
+    made = Filter(h, EMPTY, False, fs, f"equiripple {kind}, fs {fs:g}",
+                  (edges[2 * best] + edges[2 * best + 1]) / 2 / fs)
+    made.ripple = ripple
+    return made
+
+
+def from_sos(sos, fs=1.0):
+    """The filter of second-order sections, as other programs have them.
+
+    Parameters
+    ----------
+    sos : array_like
+        One section to a row: b0, b1, b2, a0, a1, a2.
+    fs : float
+        The sampling rate.
+
+    Returns
+    -------
+    Filter
+
+    Raises
+    ------
+    ValueError
+        If there are no rows of six, or an a0 is 0.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.filters.from_sos([[0.5, 0.5, 0, 1, 0, 0]])([1.0, 1.0])
+    array([0.5, 1. ])
+    """
+    sos = np.asarray(sos, float)
+    if sos.ndim != 2 or sos.shape[1] != 6 or not len(sos):
+        refuse("filters.from_sos", "sos", f"rows of six are needed; shape {sos.shape} came",
+               "ErrCoefficientSizes")
+    if np.any(sos[:, 3] == 0):
+        refuse("filters.from_sos", "sos", "a0 must not be 0", "ErrBadCoefficients")
+    sos = sos / sos[:, 3:4]
+    return Filter(sos[:, :3].ravel(), sos[:, 4:].ravel(), True, fs)
+
+
+def from_ba(b, a=(1.0,), fs=1.0):
+    """The filter of a numerator and a denominator, in direct form; without the latter the taps of one
+    without feedback.
+
+    Parameters
+    ----------
+    b, a : array_like
+        Coefficients in ascending powers of 1/z.
+    fs : float
+        The sampling rate.
+
+    Returns
+    -------
+    Filter
+
+    Raises
+    ------
+    ValueError
+        If b is empty or a begins with 0.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.filters.from_ba([0.5], [1, -0.5])([1.0, 0.0, 0.0])
+    array([0.5  , 0.25 , 0.125])
+    """
+    b, a = vector(b, "filters.from_ba", "b").astype(float), vector(a, "filters.from_ba", "a").astype(float)
+    if not len(b) or not len(a) or a[0] == 0:
+        refuse("filters.from_ba", "b, a", "b must have a coefficient, and a must not begin with 0",
+               "ErrBadCoefficients")
+    if len(a) == 1:
+        return Filter(b / a[0], EMPTY, False, fs)
+    return Filter(b, a, False, fs)
+
+
+# Smoothing
+
+def savgol(x, window_length, polyorder, deriv=0, delta=1.0, axis=LAST):
+    """Smoothing by the least-squares polynomial of the values around each (Savitzky-Golay), or a
+    derivative of it. At the ends the polynomial of the first and last values goes on.
+
+    A. Savitzky and M. J. E. Golay, "Smoothing and differentiation of data by simplified least squares
+    procedures", 1964.
+
+    Parameters
+    ----------
+    x : array_like
+        Real values.
+    window_length : int
+        How many values around each, odd, and no more than there are.
+    polyorder : int
+        The order of the polynomial, at least 1 and below window_length.
+    deriv : int
+        Which derivative; 0 for the values themselves.
+    delta : float
+        The distance between values, for derivatives.
+    axis : int
+        The axis along which to smooth.
+
+    Returns
+    -------
+    ndarray, or what x is of pandas
+        Of the shape of x.
+
+    Raises
+    ------
+    ValueError
+        If window_length is even or greater than the length of x, or polyorder or deriv is out of range.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.filters.savgol([0.0, 1.0, 4.0, 9.0, 16.0], 3, 2).round(9)
+    array([ 0.,  1.,  4.,  9., 16.])
+    >>> qx.filters.savgol([0.0, 1.0, 4.0, 9.0, 16.0], 3, 2, deriv=1).round(9) + 0.0
+    array([0., 2., 4., 6., 8.])
+    """
+    name = "filters.savgol"
+    frame = whole_number(name, "window_length", window_length, 1)
+    order = whole_number(name, "polyorder", polyorder, 1, "ErrBadCoefficients")
+    deriv = whole_number(name, "deriv", deriv, 0, "ErrNegativeCount")
+    if frame % 2 == 0:
+        refuse(name, "window_length", f"must be odd; {frame} came", "ErrBadTapCount")
+    if order >= frame:
+        refuse(name, "polyorder", f"must be below window_length, {frame}; {order} came",
+               "ErrPolynomialOrderTooHigh")
+    if count_of(x, axis) < frame:
+        refuse(name, "window_length", f"{frame} is more than there are values, {count_of(x, axis)}",
+               "ErrSizesDisagree")
+    if not deriv:
+        return along(lambda channel: core.savgol(channel, order, frame, EMPTY), x, axis)
+    if deriv > order:
+        return along(lambda channel: np.zeros(len(channel)), x, axis)
+    rows = core.savgol_coefficients(order, frame, EMPTY, 1)[1]
+    return along(lambda channel: _derivative(channel, rows, deriv) / delta**deriv, x, axis)
+
+
+def _derivative(x, rows, deriv):
+    """Row i of rows is the coefficient of t^i of the polynomial around the centre of a frame."""
+    frame, half = rows.shape[1], rows.shape[1] // 2
+    weights = math.factorial(deriv) * rows[deriv]
+    inner = core.Filter_direct(x, EMPTY, weights[::-1], EMPTY, EMPTY, 0)[0][frame - 1:]
+    t = np.arange(-half, half + 1.0)
+    ends = [np.polynomial.Polynomial(rows @ part).deriv(deriv)(t) for part in (x[:frame], x[-frame:])]
+    return np.concatenate([ends[0][:half], inner, ends[1][half + 1:]])
+
+
+def median(x, size=3, ends="reflect", axis=LAST):
+    """The running median: of the `size` values around each.
+
+    Parameters
+    ----------
+    x : array_like
+        Real values without NaN.
+    size : int
+        How many values; of an even number one more is before than behind, and the median is the mean of
+        the two in the middle.
+    ends : {"reflect", "nearest", "zero"}
+        What is beyond the ends: the mirror image with the end value twice, the end value, or zeros.
+    axis : int
+        The axis along which to filter.
+
+    Returns
+    -------
+    ndarray, or what x is of pandas
+        Of the shape of x.
+
+    Raises
+    ------
+    ValueError
+        If x is empty, size is below 1, or ends is none of its words.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.filters.median([1.0, 9.0, 2.0, 3.0, 3.0])
+    array([1., 2., 3., 3., 3.])
+    """
+    size = whole_number("filters.median", "size", size, 1, "ErrNegativeCount")
+    mode = chosen("filters.median", "ends", ends, {"reflect": "symmetric", "nearest": "edge",
+                                                   "zero": "constant"})
+    before, behind = size // 2, (size - 1) // 2
+
+    def of_channel(channel):
+        if not len(channel):
+            refuse("filters.median", "x", "is empty", "ErrEmptyInput")
+        if mode == "constant" and len(channel) > behind:
+            return core.median(channel, before, behind)
+        long = np.pad(channel, (before, behind), mode)
+        return core.median(long, before, behind)[before:before + len(channel)]
+
+    return along(of_channel, x, axis)

@@ -1,0 +1,167 @@
+"""Functions of one channel over arrays of any dimension.
+
+A channel is what lies along one axis; the others number the channels. Each channel is a call of its own,
+so its bits are those that it has alone. Where there is enough to do, channels run in threads, side by
+side while the exports work.
+"""
+
+import os
+import threading
+from concurrent.futures import ThreadPoolExecutor
+
+import numpy as np
+
+from ..outcomes import keeping, warn, works_for_another
+
+ENOUGH = 1 << 15  # elements from which on threads are worth their while
+
+
+class _Last(int):
+    """The default axis: the last one, and the rows of a pandas table, whose columns are channels."""
+
+    def __repr__(self):
+        return "-1"
+
+    def __reduce__(self):
+        return "LAST"
+
+
+LAST = _Last(-1)
+
+
+class _Workers:
+    """The threads, made when they are first needed; a forked process makes its own."""
+
+    def __init__(self):
+        self.pool, self.lock = None, threading.Lock()
+
+    def get(self):
+        with self.lock:
+            if self.pool is None:
+                self.pool = ThreadPoolExecutor(processors(), "qx")
+            return self.pool
+
+
+_workers = _Workers()
+if hasattr(os, "register_at_fork"):
+    os.register_at_fork(after_in_child=_workers.__init__)
+
+
+def processors():
+    """How many processors this process may use."""
+    return len(os.sched_getaffinity(0)) if hasattr(os, "sched_getaffinity") else os.cpu_count() or 1
+
+
+def many(function, channels, size):
+    """The results of the function for each of the channels, in order; `size` elements in all."""
+    if len(channels) < 2 or size < ENOUGH or processors() < 2 or works_for_another():
+        return [function(channel) for channel in channels]
+    done = list(_workers.get().map(lambda channel: keeping(function, channel), channels))
+    told = {(warning.export, warning.code): warning for _, kept in done for warning in kept}
+    for warning in told.values():
+        warn(warning)
+    return [found for found, _ in done]
+
+
+def is_pandas(x):
+    return type(x).__module__.partition(".")[0] == "pandas" and hasattr(x, "iloc")
+
+
+def as_array(x):
+    """x as an array of numbers; masked values are refused, since no export knows of a mask."""
+    if isinstance(x, np.ma.MaskedArray) and np.ma.is_masked(x):
+        raise ValueError(f"{np.ma.count_masked(x)} elements are masked: fill or compress the array")
+    return np.asarray(x)
+
+
+def vector(x, function, argument):
+    """x as an array of one dimension, for what has no axis."""
+    array = as_array(x)
+    if array.ndim != 1:
+        raise ValueError(f"qx.{function}: {argument}: one dimension is needed; {array.ndim} came")
+    return array
+
+
+def along(function, x, axis=LAST):
+    """The function of one channel over all channels of x, which are along the axis.
+
+    What the function returns takes the channel's place: an array of any length, a number (the axis
+    disappears), or a tuple of such, for which a tuple comes back.
+    """
+    if type(x) is np.ndarray and x.ndim == 1 and axis is LAST:
+        return function(x)
+    if is_pandas(x):
+        return _of_pandas(function, x, axis)
+    return _along(function, as_array(x), axis)
+
+
+def _along(function, x, axis):
+    if x.ndim == 0:
+        raise ValueError("an array of at least one dimension is needed; a single number came")
+    if not -x.ndim <= axis < x.ndim:
+        raise ValueError(f"axis {int(axis)} is none of an array of {x.ndim} dimension{'s'[:x.ndim - 1]}")
+    if x.ndim == 1:
+        return function(x)
+    moved = np.moveaxis(x, axis, -1)
+    flat = moved.reshape(-1, moved.shape[-1])
+    if not len(flat):
+        raise ValueError(f"an array of shape {x.shape} has no channel along axis {int(axis)}")
+    found = many(function, flat, x.size)
+    place = axis % x.ndim
+    if isinstance(found[0], tuple):
+        return tuple(_together(parts, moved.shape[:-1], place) for parts in zip(*found))
+    return _together(found, moved.shape[:-1], place)
+
+
+def _together(parts, shape, place):
+    """The results of all channels as one array, with the channel's results along the axis `place`."""
+    first = np.asarray(parts[0])
+    if any(np.shape(part) != first.shape for part in parts):
+        together = np.empty(len(parts), object)
+        together[:] = parts
+        return together.reshape(shape)
+    together = np.stack(parts).reshape(*shape, *first.shape)
+    return np.moveaxis(together, -1, place) if first.ndim == 1 else together
+
+
+def either(real, of_complex, x, axis=LAST):
+    """along(), with the function for real or for complex channels as x is the one or the other."""
+    if type(x) is np.ndarray and x.ndim == 1 and axis is LAST:
+        return of_complex(x) if x.dtype.kind == "c" else real(x)
+    if type(x) is not np.ndarray and not is_pandas(x):
+        x = as_array(x)
+    kind = x.dtype.kind if type(x) is np.ndarray else x.to_numpy().dtype.kind
+    return along(of_complex if kind == "c" else real, x, axis)
+
+
+def count_of(x, axis=LAST):
+    """How many values a channel has."""
+    shape = np.shape(x)
+    if not shape:
+        raise ValueError("an array of at least one dimension is needed; a single number came")
+    return shape[0 if axis is LAST and is_pandas(x) else axis]
+
+
+# pandas
+
+def _of_pandas(function, x, axis):
+    """Series and tables: their index stays where as many values come back, their columns always."""
+    place = 0 if axis is LAST else axis % x.ndim
+    found = _along(function, as_array(x.to_numpy()), place)
+    if isinstance(found, tuple):
+        return tuple(_dressed(part, x, place) for part in found)
+    return _dressed(found, x, place)
+
+
+def _dressed(values, x, place):
+    import pandas
+    if np.ndim(values) == 0:
+        return values
+    if x.ndim == 1:
+        index = x.index if len(values) == len(x) else None
+        return pandas.Series(values, index, name=x.name)
+    if values.ndim == 1:  # one number for each channel
+        return pandas.Series(values, x.index if place else x.columns)
+    rows = x.index if place or len(values) == len(x) else None
+    columns = x.columns if not place or values.shape[1] == x.shape[1] else None
+    return pandas.DataFrame(values, rows, columns)

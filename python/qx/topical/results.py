@@ -1,0 +1,53 @@
+"""Results of several parts, shown in words and as a table in notebooks."""
+
+import dataclasses
+import html
+
+import numpy as np
+
+
+class Result:
+    """Base of results: shown line by line, unpacked as a tuple of the fields that `_unpacked` names,
+    or of all."""
+
+    _unpacked: tuple = ()
+
+    def _shown(self):
+        """Names and texts of what is shown."""
+        return [(field.name, _text(getattr(self, field.name))) for field in dataclasses.fields(self)
+                if field.repr]
+
+    def __repr__(self):
+        rows = self._shown()
+        width = max((len(name) for name, _ in rows), default=0)
+        return "\n".join([type(self).__name__, *(f"  {name:<{width}}  {text}" for name, text in rows)])
+
+    def _repr_html_(self):
+        rows = "".join(f"<tr><th style='text-align:left'>{html.escape(name)}</th>"
+                       f"<td style='text-align:left'>{html.escape(text)}</td></tr>"
+                       for name, text in self._shown())
+        return f"<table><caption>{type(self).__name__}</caption>{rows}</table>"
+
+    def __iter__(self):
+        return iter([getattr(self, name) for name in self._unpacked or
+                     [field.name for field in dataclasses.fields(self)]])
+
+    def __len__(self):
+        return len(self._unpacked or dataclasses.fields(self))
+
+
+def _text(value):
+    if isinstance(value, np.ndarray):
+        shown = np.array2string(value, precision=6, threshold=6, edgeitems=2, separator=" ")
+        shape = " x ".join(map(str, value.shape))
+        return " ".join(shown.split()) if value.size <= 6 else f"{shape}: {' '.join(shown.split())}"
+    if isinstance(value, (float, np.floating)):
+        return f"{value:.6g}"
+    if isinstance(value, dict):
+        return ", ".join(f"{name} {_text(one)}" for name, one in value.items())
+    return str(value)
+
+
+def result(of_class):
+    """A dataclass, derived from Result, that is shown as that says."""
+    return dataclasses.dataclass(eq=False, repr=False)(of_class)

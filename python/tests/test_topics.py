@@ -1,0 +1,172 @@
+"""What all topics share: places of names, axes, threads, pandas, words and refusals, results, streams."""
+
+import doctest
+import importlib
+import inspect
+import pickle
+import sys
+import threading
+import unittest
+import unittest.mock
+import warnings
+from pathlib import Path
+
+import hypothesis
+import numpy as np
+import pandas
+from hypothesis import strategies
+
+PYTHON = Path(__file__).resolve().parent.parent
+sys.path.insert(0, str(PYTHON))
+import qx  # noqa: E402
+from qx.topical import LAST, Result, along, axes, newest, result, words  # noqa: E402
+
+TOPICS = {name: importlib.import_module(f"qx.{name}") for name in newest.TOPICS}
+SECTIONS = ("Parameters\n", "Returns\n", "Examples\n")
+
+
+class Names(unittest.TestCase):
+    def test_topics_come_first_and_exports_stay(self):
+        self.assertEqual(dir(qx)[:len(TOPICS)], sorted(TOPICS))
+        self.assertEqual(set(qx.names()) - set(dir(qx)), set())
+        self.assertEqual(dir(qx.exports), sorted(qx.names()))
+        self.assertIs(qx.Mean_head, qx.exports.Mean_head)
+
+    def test_wrong_names_are_answered_with_their_place(self):
+        for place, name in ((qx, "butterworth"), (qx.exports, "Butterworth"), (qx, "butterwort")):
+            with self.assertRaisesRegex(AttributeError, r"it is qx\.filters\.butterworth"):
+                getattr(place, name)
+        with self.assertRaisesRegex(AttributeError, "did you mean Mean_head"):
+            qx.exports.Mean_hed
+
+    def test_every_key_of_the_table_belongs_to_a_function(self):
+        for topic, keys in newest.NEWEST.items():
+            public = TOPICS[topic].__all__
+            self.assertEqual(public, sorted(public), topic)
+            for key, name in keys.items():
+                self.assertIn(name, qx.names())
+                self.assertTrue(any(key == one or key.startswith(f"{one}_") for one in public),
+                                f"{topic}.{key}")
+
+    def test_every_function_has_a_text_with_its_arguments(self):
+        for topic, module in TOPICS.items():
+            for name in module.__all__:
+                value = getattr(module, name)
+                self.assertTrue(value.__doc__, f"{topic}.{name}")
+                if inspect.isfunction(value):
+                    for section in SECTIONS:
+                        self.assertIn(section, value.__doc__, f"{topic}.{name}")
+                    for argument in inspect.signature(value).parameters:
+                        self.assertRegex(value.__doc__, rf"(?m)^    (\w+, )*{argument}(, \w+)* : ",
+                                         f"{topic}.{name}")
+
+    def test_examples_give_what_they_show(self):
+        for topic, module in TOPICS.items():
+            with self.subTest(topic=topic):
+                self.assertEqual(doctest.testmod(module).failed, 0)
+
+
+class Axes(unittest.TestCase):
+    @hypothesis.given(strategies.lists(strategies.integers(1, 5), min_size=1, max_size=4), strategies.data())
+    @hypothesis.settings(max_examples=60, deadline=None)
+    def test_each_channel_has_the_bits_that_it_has_alone(self, shape, data):
+        axis = data.draw(strategies.integers(-len(shape), len(shape) - 1))
+        x = np.random.default_rng(sum(shape)).normal(size=shape)
+        for alone, n in ((lambda channel: np.cumsum(channel), None),
+                         (lambda channel: np.r_[channel, channel], None),
+                         (lambda channel: channel.sum(), 1)):
+            found = along(alone, x, axis)
+            expected = np.apply_along_axis(alone, axis, x)
+            self.assertEqual(np.asarray(found).tobytes(), expected.tobytes())
+            self.assertEqual(np.shape(found), expected.shape)
+
+    def test_channels_run_in_threads_with_the_same_bits(self):
+        x = np.random.default_rng(1).normal(size=(8, 5000))
+        used = set()
+
+        def alone(channel):
+            used.add(threading.get_ident())
+            return qx.fft.rfft(channel)
+
+        with unittest.mock.patch.object(axes, "processors", lambda: 2):
+            found = along(alone, x)
+            self.assertNotIn(threading.get_ident(), used)
+            nested = along(lambda channel: along(alone, np.stack([channel] * 2))[1], x)
+        self.assertEqual(found.tobytes(), np.stack([qx.fft.rfft(row) for row in x]).tobytes())
+        self.assertEqual(nested.tobytes(), found.tobytes())
+
+    def test_failures_and_warnings_of_threads_reach_the_caller(self):
+        x = np.ones((4, 20000))
+        with unittest.mock.patch.object(axes, "processors", lambda: 2):
+            with warnings.catch_warnings(record=True) as given:
+                warnings.simplefilter("always")
+                along(lambda channel: qx.MSE_head(channel, channel[:-1]), x)
+            self.assertEqual([(str(Path(one.filename).name), one.message.name) for one in given],
+                             [(Path(__file__).name, "WarnLengthsDiffer")])
+            with self.assertRaises(ValueError):
+                along(lambda channel: qx.Mean_head(channel[:0]), x)
+
+    def test_pandas_keeps_index_and_columns(self):
+        index = pandas.date_range("2024-01-01", periods=50, freq="s")
+        table = pandas.DataFrame(np.random.default_rng(1).normal(size=(50, 2)), index, ["a", "b"])
+        f = qx.filters.butterworth(2, 0.1)
+        found = f(table)
+        pandas.testing.assert_index_equal(found.index, index)
+        self.assertEqual([*found.columns], ["a", "b"])
+        np.testing.assert_array_equal(found["b"], f(table["b"].to_numpy()))
+        self.assertEqual(f(table["a"]).name, "a")
+        pandas.testing.assert_frame_equal(f(table, axis=0), found)
+        self.assertEqual(qx.fft.rfft(table).shape, (26, 2))
+        self.assertEqual([*qx.fft.rfft(table).columns], ["a", "b"])
+        self.assertEqual([*along(lambda channel: channel.sum(), table).index], ["a", "b"])
+
+    def test_what_has_no_channel_is_refused(self):
+        for x, axis in ((1.0, LAST), (np.zeros((2, 3)), 2), (np.zeros((0, 3)), -1)):
+            with self.assertRaises(ValueError):
+                qx.fft.fft(x, axis=axis)
+        with self.assertRaisesRegex(ValueError, "1 elements are masked"):
+            qx.fft.fft(np.ma.masked_equal([1.0, 2.0], 2.0))
+        self.assertEqual(repr(inspect.signature(qx.fft.rfft).parameters["axis"]), "<Parameter \"axis=-1\">")
+        self.assertIs(pickle.loads(pickle.dumps(LAST)), LAST)
+
+
+class Refusals(unittest.TestCase):
+    def test_words_are_listed(self):
+        with self.assertRaises(ValueError) as caught:
+            qx.filters.butterworth(4, 0.1, "lowpas")
+        self.assertEqual(str(caught.exception), "qx.filters.butterworth: kind: 'lowpas' is none of 'lowpass', "
+                         "'highpass', 'bandpass', 'bandstop'; did you mean 'lowpass'? (ErrInvalidSelector)")
+        self.assertEqual((caught.exception.name, caught.exception.code), ("ErrInvalidSelector", -20061))
+        self.assertIsInstance(caught.exception, qx.QxError)
+        again = pickle.loads(pickle.dumps(caught.exception))
+        self.assertEqual((str(again), again.code), (str(caught.exception), -20061))
+        with self.assertRaisesRegex(ValueError, "0 is none of 'lowpass'"):
+            qx.filters.butterworth(4, 0.1, 0)
+
+    def test_whole_numbers(self):
+        self.assertEqual(words.whole_number("f", "n", 3.0), 3)
+        self.assertRaisesRegex(TypeError, "f: n: a whole number", words.whole_number, "f", "n", 2.5)
+        self.assertRaisesRegex(ValueError, "n: must be at least 1", words.whole_number, "f", "n", 0, 1)
+
+
+@result
+class Sample(Result):
+    """For the tests."""
+    places: np.ndarray
+    count: int
+    level: float
+    _unpacked = ("places", "count")
+
+
+class Results(unittest.TestCase):
+    def test_they_are_shown_and_unpacked(self):
+        found = Sample(np.arange(3.0), 3, 1 / 3)
+        self.assertEqual(repr(found), "Sample\n  places  [0. 1. 2.]\n  count   3\n  level   0.333333")
+        self.assertIn("<th style='text-align:left'>level</th>", found._repr_html_())
+        places, count = found
+        self.assertEqual((len(places), count, len(found)), (3, 3, 2))
+        self.assertIn("2 x 50: [[0. 0. ... 0. 0.]", repr(Sample(np.zeros((2, 50)), 1, 0.0)))
+
+
+if __name__ == "__main__":
+    unittest.main()
