@@ -8,9 +8,8 @@ import soundfile
 
 from . import outputs
 from .calls import call
+from .multirate import low_pass
 
-ATTENUATION = 123.0  # dB by the estimate, 122 by the spectrum of the taps, of what would fold back
-PASSBAND = 0.9  # the part of the lower band that passes unchanged
 FRAMES_AT_ONCE = 1 << 15
 LARGEST_FACTOR = 1 << 17  # beyond it the taps fill the memory
 FORMATS = {".wav": "WAV", ".wave": "WAV", ".flac": "FLAC", ".aif": "AIFF", ".aiff": "AIFF",
@@ -18,19 +17,6 @@ FORMATS = {".wav": "WAV", ".wave": "WAV", ".flac": "FLAC", ".aif": "AIFF", ".aif
 BYTES_OF_32 = 2**32 - 2**16  # where files end that have their length in 32 bits
 REALS = ("FLOAT", "DOUBLE")  # sample formats that hold what lies beyond full scale
 SAMPLE_BYTES = {"PCM_U8": 1, "PCM_16": 2, "PCM_24": 3, "PCM_32": 4, "FLOAT": 4}
-
-
-def low_pass(up, down, attenuation=ATTENUATION, passband=PASSBAND):
-    """Taps for a change of the rate by up / down, of odd number and unit sum: a sinc with Kaiser's
-    window, whose stopband begins where the lower of both bands ends. The estimates of length and
-    shape are those of scipy.signal.kaiserord."""
-    edge = 1 / max(up, down)  # of the lower band, 1 being half the rate of the grid
-    width = edge * (1 - passband)
-    half = math.ceil((attenuation - 7.95) / (2.285 * math.pi * width) / 2)
-    cutoff = edge * (1 + passband) / 2
-    taps = (np.sinc(cutoff * np.arange(-half, half + 1))
-            * np.kaiser(2 * half + 1, 0.1102 * (attenuation - 8.7)))
-    return taps / taps.sum()
 
 
 class Resampler:

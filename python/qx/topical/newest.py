@@ -9,7 +9,7 @@ import importlib
 from ..calls import export, hint
 from ..library import library
 
-TOPICS = ("filters", "fft", "windows")  # in the order in which they are shown
+TOPICS = ("filters", "fft", "windows", "spectra", "signals", "noise", "multirate")  # in the order in which they are shown
 
 NEWEST = {
     "filters": {
@@ -35,6 +35,36 @@ NEWEST = {
     "windows": {
         "get": "AllWinH", "apply": "AllWinH", "apply_complex": "CxAllWinH", "cosine_sum": "GenCosWinH",
         "constants": "NumWinConstH",
+    },
+    "spectra": {
+        "welch": "ReOXFFTH", "welch_sized": "ReOXFFTH80", "welch_complex": "CxOXFFTH",
+        "welch_complex_sized": "CxOXFFTH80", "power": "SpectrumH", "power_complex": "CxSpectrumH",
+        "analytic": "FastHilbertTransformH", "instantaneous_phase": "unWrap85",
+    },
+    "signals": {
+        "sine": "SineWaveCIN", "square": "SquareWaveCIN", "triangle": "TriangleWaveCIN",
+        "sawtooth": "SawtoothWaveCIN", "arbitrary": "ArbitraryWaveCIN", "chirp": "ChirpCIN",
+        "pulse": "PulsePtrn", "impulse": "ImpulsePtrn", "ramp": "RampPtrn85", "sinc": "SincWave",
+        "gauss_pulse": "GaussPulseH", "gauss_monopulse": "GaussMonopulseH",
+        "triangle_pulse": "AperiodTriangleH", "periodic_sinc": "PeriodicSincH",
+        "phase_modulated": "PhasMod", "frequency_modulated": "FreqMod", "unwrap": "unWrap85",
+        "convolve": "Convolution", "convolve_complex": "CxConvolution", "correlate": "Rxy80",
+        "autocorrelate": "AutoCorrelation80", "deconvolve": "Deconvolution",
+        "convolve2": "Convolve_2DH", "convolve2_complex": "CxConvolve_2DH",
+        "correlate2": "Correlation_2DH", "correlate2_complex": "CxCorrelation_2DH",
+        "detrend": "PolyFit81_head", "standardize": "Norm1", "rescale": "Scale1DCIN",
+    },
+    "noise": {
+        "uniform": "white", "gaussian": "Gauss", "periodic": "PeriodNoise", "gamma": "GammaNoiseH",
+        "poisson": "PoissonNoiseH", "binomial": "BinomialNoiseH", "permutation": "RiffleIntNum2012_head",
+    },
+    "multirate": {
+        "resample": "ppMultiRateFIRH_DBL", "resample_single": "ppMultiRateFIRH_SGL",
+        "resample_complex": "ppMultiRateFIRH_CDB", "resample_complex_single": "ppMultiRateFIRH_CSG",
+        "decimate": "DecimateContinuous_H", "decimate_complex": "CxDecimateContinuous_H",
+        "moving_sum": "ReCascadedMovingAverageH", "moving_sum_complex": "CxCascadedMovingAverageH",
+        "cic_decimate": "CICDecimatorByMovH", "cic_interpolate": "CICInterpolatorByMovH",
+        "shift_frequency": "ReComplexModulatorH", "shift_frequency_complex": "CxComplexModulatorH",
     },
 }
 

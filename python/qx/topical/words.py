@@ -19,7 +19,8 @@ def chosen(function, argument, value, words):
         return words[value]
     except (KeyError, TypeError):
         pass
-    near = difflib.get_close_matches(value.lower(), words, 1) if isinstance(value, str) else []
+    near = difflib.get_close_matches(value.lower(), [word for word in words if isinstance(word, str)], 1) \
+        if isinstance(value, str) else []
     known = ", ".join(repr(word) for word in words)
     refuse(function, argument, f"{value!r} is none of {known}" + "".join(
         f"; did you mean {word!r}?" for word in near))

@@ -1,0 +1,976 @@
+"""Waves, pulses and patterns, and what is done to whole signals: trends, scales, convolution and
+correlation.
+
+Frequencies are in the unit of the sampling rate `fs`, phases in radians.
+"""
+
+import math
+
+import numpy as np
+
+from .topical import LAST, along, chosen, count_of, either, refuse, served, vector, whole_number
+from .topical.axes import as_array
+
+__all__ = ["arbitrary", "autocorrelate", "chirp", "convolve", "convolve2", "correlate", "correlate2",
+           "deconvolve", "detrend", "frequency_modulated", "gauss_monopulse", "gauss_pulse", "impulse",
+           "periodic_sinc", "phase_modulated", "pulse", "ramp", "rescale", "sawtooth", "sinc", "sine",
+           "square", "standardize", "triangle", "triangle_pulse", "unwrap"]
+
+core = served("signals")
+
+EMPTY = np.empty(0)
+NORMALIZATIONS = {"none": 0, "unbiased": 1, "biased": 2}
+METHODS = {"direct": 0, "fft": 1}
+DIRECT = 64  # up to the shorter length direct sums are faster than transforms
+
+
+def _wave(name, n, frequency, fs, amplitude, phase, *more):
+    n = whole_number(f"signals.{name}", "n", n, 1)
+    if not fs > 0:
+        refuse(f"signals.{name}", "fs", f"must be above 0; {fs} came", "ErrSamplingNotPositive")
+    return getattr(core, name)(n, float(amplitude), frequency / fs, math.degrees(phase), *more)[0]
+
+
+def _of_times(name, t, *arguments):
+    """A pulse at times of the caller's, of any shape."""
+    times = np.asarray(t, float)
+    if not times.size:
+        refuse(f"signals.{name}", "t", "is empty", "ErrEmptyInput")
+    return getattr(core, name)(times.ravel(), 0, *arguments).reshape(times.shape)
+
+
+def sine(n, frequency, fs=1.0, amplitude=1.0, phase=0.0):
+    r"""A sine wave.
+
+    .. math:: x_i = A \sin(2\pi f i / f_s + \varphi)
+
+    Parameters
+    ----------
+    n : int
+        How many values.
+    frequency : float
+        In the unit of fs.
+    fs : float
+        The sampling rate.
+    amplitude : float
+        The largest magnitude.
+    phase : float
+        The phase of the first value, in radians.
+
+    Returns
+    -------
+    ndarray of float64
+
+    Raises
+    ------
+    ValueError
+        If n is below 1 or fs is not above 0.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.signals.sine(4, 250, fs=1000).round(12) + 0.0
+    array([ 0.,  1.,  0., -1.])
+    """
+    return _wave("sine", n, frequency, fs, amplitude, phase)
+
+
+def square(n, frequency, fs=1.0, amplitude=1.0, phase=0.0, duty=0.5):
+    """A square wave between amplitude and -amplitude.
+
+    Parameters
+    ----------
+    n : int
+        How many values.
+    frequency : float
+        In the unit of fs.
+    fs : float
+        The sampling rate.
+    amplitude : float
+        The largest magnitude.
+    phase : float
+        The phase of the first value, in radians.
+    duty : float
+        The part of a period that is high, from 0 to 1.
+
+    Returns
+    -------
+    ndarray of float64
+
+    Raises
+    ------
+    ValueError
+        If n is below 1 or fs is not above 0.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.signals.square(4, 250, fs=1000)
+    array([ 1.,  1., -1., -1.])
+    """
+    return _wave("square", n, frequency, fs, amplitude, phase, 100 * float(duty))
+
+
+def triangle(n, frequency, fs=1.0, amplitude=1.0, phase=0.0):
+    """A triangle wave, which begins as a sine does: up from 0.
+
+    Parameters
+    ----------
+    n : int
+        How many values.
+    frequency : float
+        In the unit of fs.
+    fs : float
+        The sampling rate.
+    amplitude : float
+        The largest magnitude.
+    phase : float
+        The phase of the first value, in radians.
+
+    Returns
+    -------
+    ndarray of float64
+
+    Raises
+    ------
+    ValueError
+        If n is below 1 or fs is not above 0.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.signals.triangle(4, 250, fs=1000)
+    array([ 0.,  1.,  0., -1.])
+    """
+    return _wave("triangle", n, frequency, fs, amplitude, phase)
+
+
+def sawtooth(n, frequency, fs=1.0, amplitude=1.0, phase=0.0):
+    """A sawtooth wave: up from 0 to amplitude in half a period, and from -amplitude to 0 in the other
+    half.
+
+    Parameters
+    ----------
+    n : int
+        How many values.
+    frequency : float
+        In the unit of fs.
+    fs : float
+        The sampling rate.
+    amplitude : float
+        The largest magnitude.
+    phase : float
+        The phase of the first value, in radians.
+
+    Returns
+    -------
+    ndarray of float64
+
+    Raises
+    ------
+    ValueError
+        If n is below 1 or fs is not above 0.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.signals.sawtooth(4, 250, fs=1000)
+    array([ 0. ,  0.5, -1. , -0.5])
+    """
+    return _wave("sawtooth", n, frequency, fs, amplitude, phase)
+
+
+def arbitrary(n, table, frequency, fs=1.0, amplitude=1.0, phase=0.0, interpolate=True):
+    """A wave whose period is in a table.
+
+    Parameters
+    ----------
+    n : int
+        How many values.
+    table : array_like
+        One period.
+    frequency : float
+        In the unit of fs.
+    fs : float
+        The sampling rate.
+    amplitude : float
+        What the table is multiplied by.
+    phase : float
+        The phase of the first value, in radians.
+    interpolate : bool
+        Lines between the values of the table in place of steps.
+
+    Returns
+    -------
+    ndarray of float64
+
+    Raises
+    ------
+    ValueError
+        If n is below 1 or fs is not above 0.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.signals.arbitrary(6, [0.0, 1.0], 0.25)
+    array([0. , 0.5, 1. , 0.5, 0. , 0.5])
+    """
+    return _wave("arbitrary", n, frequency, fs, amplitude, phase,
+                 vector(table, "signals.arbitrary", "table"), int(interpolate))
+
+
+def chirp(n, f0, f1, fs=1.0, amplitude=1.0):
+    r"""A sine whose frequency rises evenly from f0 at the first value to f1 one behind the last.
+
+    .. math:: x_i = A \sin\left(2\pi i \left(f_0 + \frac{f_1 - f_0}{2n} i\right) / f_s\right)
+
+    Parameters
+    ----------
+    n : int
+        How many values.
+    f0, f1 : float
+        The frequencies, in the unit of fs.
+    fs : float
+        The sampling rate.
+    amplitude : float
+        The largest magnitude.
+
+    Returns
+    -------
+    ndarray of float64
+
+    Raises
+    ------
+    ValueError
+        If n is below 1 or fs is not above 0.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.signals.chirp(4, 0, 500, fs=1000).round(6)
+    array([ 0.      ,  0.382683,  1.      , -0.382683])
+    """
+    n = whole_number("signals.chirp", "n", n, 1)
+    if not fs > 0:
+        refuse("signals.chirp", "fs", f"must be above 0; {fs} came", "ErrSamplingNotPositive")
+    return core.chirp(n, float(amplitude), f0 / fs, f1 / fs)
+
+
+def pulse(n, delay, width, amplitude=1.0):
+    """A rectangle: `width` values of amplitude from `delay` on, the others 0.
+
+    Parameters
+    ----------
+    n : int
+        How many values.
+    delay : int
+        How many values come before.
+    width : int
+        How many values are high.
+    amplitude : float
+        The largest magnitude.
+
+    Returns
+    -------
+    ndarray of float64
+
+    Raises
+    ------
+    ValueError
+        If n is below 1, or the pulse is not inside.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.signals.pulse(5, 1, 2)
+    array([0., 1., 1., 0., 0.])
+    """
+    n = whole_number("signals.pulse", "n", n, 1)
+    return core.pulse(n, float(amplitude), delay, width)
+
+
+def impulse(n, delay=0, amplitude=1.0):
+    """One value of amplitude, the others 0.
+
+    Parameters
+    ----------
+    n : int
+        How many values.
+    delay : int
+        Where it is.
+    amplitude : float
+        The largest magnitude.
+
+    Returns
+    -------
+    ndarray of float64
+
+    Raises
+    ------
+    ValueError
+        If n is below 1, or delay is not inside.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.signals.impulse(4, 1)
+    array([0., 1., 0., 0.])
+    """
+    n = whole_number("signals.impulse", "n", n, 1)
+    return core.impulse(n, float(amplitude), delay)
+
+
+def ramp(n, start, stop, endpoint=True, scale="linear"):
+    """Values from start to stop, evenly spaced or in equal ratios.
+
+    Parameters
+    ----------
+    n : int
+        How many values.
+    start, stop : float
+        The first and the last value.
+    endpoint : bool
+        Whether stop is the last value, or would be the next one.
+    scale : {"linear", "geometric"}
+        Equal steps or equal ratios.
+
+    Returns
+    -------
+    ndarray of float64
+
+    Raises
+    ------
+    ValueError
+        If n is below 1, 1 with different ends, or an end is not above 0 on a geometric scale.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.signals.ramp(4, 1, 1000, scale="geometric").round(9)
+    array([   1.,   10.,  100., 1000.])
+    """
+    code = chosen("signals.ramp", "scale", scale, {"linear": 0, "geometric": 1})
+    n = whole_number("signals.ramp", "n", n, 1)
+    return core.ramp(n, float(start), float(stop), int(not endpoint), code)
+
+
+def sinc(n, dt=1.0, delay=0.0, amplitude=1.0):
+    r"""The cardinal sine.
+
+    .. math:: x_i = A \frac{\sin \pi t}{\pi t},\quad t = i\,\Delta t - d
+
+    Parameters
+    ----------
+    n : int
+        How many values.
+    dt : float
+        The time between values.
+    delay : float
+        The time of the peak.
+    amplitude : float
+        The largest magnitude.
+
+    Returns
+    -------
+    ndarray of float64
+
+    Raises
+    ------
+    ValueError
+        If n is below 1 or dt is not above 0.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.signals.sinc(3, 0.5, 0.5).round(6)
+    array([0.63662, 1.     , 0.63662])
+    """
+    n = whole_number("signals.sinc", "n", n, 1)
+    return core.sinc(n, float(amplitude), float(delay), float(dt))
+
+
+def gauss_pulse(t, fc, bandwidth=0.5, level=-6.0, amplitude=1.0):
+    r"""A cosine under a Gaussian.
+
+    .. math:: x = A e^{-k (\pi f_c t)^2} \cos 2\pi f_c t,\quad k = \frac{5 b^2}{\ln 10 \cdot L}
+
+    The spectrum of the pulse is L dB down at a distance of b fc / 2 from fc.
+
+    Parameters
+    ----------
+    t : array_like
+        Times.
+    fc : float
+        The frequency of the cosine, by the unit of time.
+    bandwidth : float
+        The width of the spectrum as a part of fc.
+    level : float
+        Where that width is taken: so many dB, negative, below the top.
+    amplitude : float
+        The largest magnitude.
+
+    Returns
+    -------
+    ndarray of float64
+
+    Raises
+    ------
+    ValueError
+        If t is empty, fc or bandwidth is not above 0, or level not below.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.signals.gauss_pulse([0.0, 0.1], 5).round(6)
+    array([ 1.      , -0.799918])
+    """
+    if not level < 0:
+        refuse("signals.gauss_pulse", "level", f"must be below 0 dB; {level} came", "ErrNotStrictlyPositive")
+    return _of_times("gauss_pulse", t, float(amplitude), 0.0, 1.0, float(fc), float(bandwidth), -float(level))
+
+
+def gauss_monopulse(t, fc, amplitude=1.0):
+    r"""The derivative of a Gaussian, with its peak at t = 1 / (2 pi fc).
+
+    .. math:: x = 2 A \sqrt{e}\, u e^{-2u^2},\quad u = \pi f_c t
+
+    Parameters
+    ----------
+    t : array_like
+        Times.
+    fc : float
+        The frequency of the most power, by the unit of time.
+    amplitude : float
+        The largest magnitude.
+
+    Returns
+    -------
+    ndarray of float64
+
+    Raises
+    ------
+    ValueError
+        If t is empty or fc is not above 0.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.signals.gauss_monopulse([0.0, 0.1], 5).round(6)
+    array([0.      , 0.037251])
+    """
+    return core.gauss_monopulse(_times("gauss_monopulse", t).ravel(), 0, 1.0, 0.0, float(fc), float(amplitude)).reshape(np.shape(t))
+
+
+def triangle_pulse(t, width=1.0, skew=0.5, amplitude=1.0):
+    """One triangle about t = 0.
+
+    Parameters
+    ----------
+    t : array_like
+        Times.
+    width : float
+        Its width, in the unit of time.
+    skew : float
+        Where the peak is, as a part of the width, from 0 to 1.
+    amplitude : float
+        The largest magnitude.
+
+    Returns
+    -------
+    ndarray of float64
+
+    Raises
+    ------
+    ValueError
+        If t is empty, width is not above 0, or skew not from 0 to 1.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.signals.triangle_pulse([-0.5, -0.25, 0.0, 0.25])
+    array([0. , 0.5, 1. , 0.5])
+    """
+    return _of_times("triangle_pulse", t, float(amplitude), 0.0, 1.0, float(width), float(skew))
+
+
+def periodic_sinc(t, order, amplitude=1.0):
+    r"""The periodic cardinal sine (Dirichlet).
+
+    .. math:: x = A \frac{\sin(N t / 2)}{N \sin(t / 2)}
+
+    Parameters
+    ----------
+    t : array_like
+        Times.
+    order : int
+        The order N.
+    amplitude : float
+        The largest magnitude.
+
+    Returns
+    -------
+    ndarray of float64
+
+    Raises
+    ------
+    ValueError
+        If t is empty or order is below 1.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.signals.periodic_sinc([0.0, 1.0], 3).round(6)
+    array([1.      , 0.693535])
+    """
+    order = whole_number("signals.periodic_sinc", "order", order, 1, "ErrNotStrictlyPositive")
+    return _of_times("periodic_sinc", t, float(amplitude), order, 1.0, 0.0)
+
+
+def phase_modulated(x, fc, fs=1.0):
+    r"""A sine of frequency fc whose phase moves by x.
+
+    .. math:: y_i = \sin(2\pi f_c (i + 1) / f_s + x_i)
+
+    Parameters
+    ----------
+    x : array_like
+        Phases in radians.
+    fc : float
+        The frequency of the carrier, in the unit of fs.
+    fs : float
+        The sampling rate.
+
+    Returns
+    -------
+    ndarray of float64
+
+    Raises
+    ------
+    ValueError
+        If x has another number of dimensions than one, or fs is not above 0.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.signals.phase_modulated([0.0, 0.0, 1.57079632679], 0.25).round(6)
+    array([ 1.,  0., -0.])
+    """
+    return _modulated("phase_modulated", np.degrees(vector(x, "signals.phase_modulated", "x")), fc, fs)
+
+
+def frequency_modulated(x, fc, fs=1.0):
+    r"""A sine whose frequency is fc + x.
+
+    .. math:: y_i = \sin\Big(\frac{2\pi}{f_s} \sum_{j \le i} (f_c + x_j)\Big)
+
+    Parameters
+    ----------
+    x : array_like
+        Frequencies, in the unit of fs.
+    fc : float
+        The frequency of the carrier, in the unit of fs.
+    fs : float
+        The sampling rate.
+
+    Returns
+    -------
+    ndarray of float64
+
+    Raises
+    ------
+    ValueError
+        If x has another number of dimensions than one, or fs is not above 0.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.signals.frequency_modulated([0.0, 0.0, 0.25, 0.0], 0.25).round(6) + 0.0
+    array([1., 0., 0., 1.])
+    """
+    return _modulated("frequency_modulated", vector(x, "signals.frequency_modulated", "x"), fc, fs)
+
+
+def _times(name, t):
+    times = np.asarray(t, float)
+    if not times.size:
+        refuse(f"signals.{name}", "t", "is empty", "ErrEmptyInput")
+    return times
+
+
+def _modulated(name, x, fc, fs):
+    if not fs > 0:
+        refuse(f"signals.{name}", "fs", f"must be above 0; {fs} came", "ErrSamplingNotPositive")
+    return getattr(core, name)(len(x), 1 / fs, float(fc), np.asarray(x, float), 0.0, 0.0)[1]
+
+
+def detrend(x, type="linear", axis=LAST):
+    """The values without their mean, line, or polynomial of least squares.
+
+    Parameters
+    ----------
+    x : array_like
+        Real values.
+    type : {"linear", "constant"} or int
+        What is taken away; a number is the order of a polynomial, up to 25.
+    axis : int
+        The axis along which to work.
+
+    Returns
+    -------
+    ndarray, or what x is of pandas
+        Of the shape of x.
+
+    Raises
+    ------
+    ValueError
+        If x is too short for the order, or type is none of its words.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.signals.detrend([1.0, 2.0, 4.0, 5.0]).round(6)
+    array([ 0.1, -0.3,  0.3, -0.1])
+    """
+    order = type if isinstance(type, int) and type is not True else \
+        chosen("signals.detrend", "type", type, {"linear": 1, "constant": 0})
+    order = whole_number("signals.detrend", "type", order, 0, "ErrPolynomialOrderNegative")
+
+    def of_channel(channel):
+        if len(channel) <= order:
+            refuse("signals.detrend", "x", f"more than {order} values are needed; {len(channel)} came",
+                   "ErrPolynomialOrderTooHigh")
+        t = np.linspace(-1, 1, len(channel)) if len(channel) > 1 else np.zeros(1)
+        if not order:
+            return channel - np.mean(channel)
+        return channel - core.detrend(t, channel, order, EMPTY, 0, [], [])[0]
+
+    return along(of_channel, x, axis)
+
+
+def unwrap(x, period=2 * math.pi, axis=LAST):
+    """Phases without jumps: each moved by whole periods to within half a one of its neighbour.
+
+    Parameters
+    ----------
+    x : array_like
+        Phases.
+    period : float
+        A turn: 2 pi, 360, 1, ...
+    axis : int
+        The axis along which to work.
+
+    Returns
+    -------
+    ndarray, or what x is of pandas
+        Of the shape of x.
+
+    Raises
+    ------
+    ValueError
+        If x is empty.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.signals.unwrap([0.0, 350.0, 340.0, 10.0], 360)
+    array([  0., -10., -20.,  10.])
+    """
+    if period == 2 * math.pi:
+        return along(lambda channel: core.unwrap(channel, 0), x, axis)
+    if period == 360:
+        return along(lambda channel: core.unwrap(channel, 2), x, axis)
+    scale = 2 * math.pi / period
+    return along(lambda channel: core.unwrap(channel * scale, 0) / scale, x, axis)
+
+
+def standardize(x, axis=LAST):
+    """Values with the mean 0 and the standard deviation 1.
+
+    Parameters
+    ----------
+    x : array_like
+        Real values.
+    axis : int
+        The axis along which to work.
+
+    Returns
+    -------
+    ndarray, or what x is of pandas
+        Of the shape of x; NaN where all values are equal.
+
+    Raises
+    ------
+    ValueError
+        If x is empty.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.signals.standardize([1.0, 3.0])
+    array([-1.,  1.])
+    """
+    return along(lambda channel: core.standardize(channel)[0], x, axis)
+
+
+def rescale(x, low=-1.0, high=1.0, axis=LAST):
+    """Values moved and stretched so that the least is low and the greatest high.
+
+    Parameters
+    ----------
+    x : array_like
+        Real values.
+    low, high : float
+        The new bounds.
+    axis : int
+        The axis along which to work.
+
+    Returns
+    -------
+    ndarray, or what x is of pandas
+        Of the shape of x.
+
+    Raises
+    ------
+    ValueError
+        If x is empty.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.signals.rescale([1.0, 2.0, 5.0], 0, 1)
+    array([0.  , 0.25, 1.  ])
+    """
+    return along(lambda channel: (core.rescale(channel)[0] + 1) * ((high - low) / 2) + low, x, axis)
+
+
+def _method(function, method, x, y):
+    if method == "auto":
+        return int(min(len(x), len(y)) > DIRECT)
+    return chosen(function, "method", method, {"auto": 1, **METHODS})
+
+
+def _part(full, mode, function, nx, ny):
+    """What `mode` keeps of the full result."""
+    mode = chosen(function, "mode", mode, {"full": "full", "same": "same", "valid": "valid"})
+    if mode == "full":
+        return full
+    size = nx if mode == "same" else max(nx, ny) - min(nx, ny) + 1
+    first = (len(full) - size) // 2
+    return full[first:first + size]
+
+
+def _both(function, x, y):
+    x, y = vector(x, function, "x"), vector(y, function, "y")
+    if not len(x) or not len(y):
+        refuse(function, "x, y", "an array is empty", "ErrEmptyInput")
+    return x, y, x.dtype.kind == "c" or y.dtype.kind == "c"
+
+
+def convolve(x, y, mode="full", method="auto"):
+    r"""The convolution of two sequences.
+
+    .. math:: z_t = \sum_i x_i y_{t-i}
+
+    Parameters
+    ----------
+    x, y : array_like
+        Real or complex values.
+    mode : {"full", "same", "valid"}
+        All nx + ny - 1 values; as many as x has, in the middle; those to which all of the shorter one
+        contributes.
+    method : {"auto", "direct", "fft"}
+        Direct sums, exact to rounding, or transforms, faster for long sequences.
+
+    Returns
+    -------
+    ndarray
+
+    Raises
+    ------
+    ValueError
+        If an array is empty or has another number of dimensions than one, or a word is none of its words.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.signals.convolve([1.0, 2.0, 3.0], [1.0, -1.0])
+    array([ 1.,  1.,  1., -3.])
+    """
+    x, y, is_complex = _both("signals.convolve", x, y)
+    method = _method("signals.convolve", method, x, y)
+    full = core.convolve_complex(x, y, method, 0, 0) if is_complex else core.convolve(x, y, method)
+    return _part(full, mode, "signals.convolve", len(x), len(y))
+
+
+def correlate(x, y, mode="full", method="auto", normalization="none"):
+    r"""The cross-correlation of two sequences.
+
+    .. math:: z_k = \sum_l x_l\, \overline{y_{l - k + n_y - 1}}
+
+    Parameters
+    ----------
+    x, y : array_like
+        Real or complex values.
+    mode : {"full", "same", "valid"}
+        As of `convolve`; in the full result lag 0 is at ny - 1.
+    method : {"auto", "direct", "fft"}
+        As of `convolve`.
+    normalization : {"none", "unbiased", "biased"}
+        Nothing; each lag by the number of its terms; all by the greater length.
+
+    Returns
+    -------
+    ndarray
+
+    Raises
+    ------
+    ValueError
+        As of `convolve`.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.signals.correlate([1.0, 2.0, 3.0], [0.0, 1.0, 0.5])
+    array([0.5, 2. , 3.5, 3. , 0. ])
+    """
+    x, y, is_complex = _both("signals.correlate", x, y)
+    method = _method("signals.correlate", method, x, y)
+    norm = chosen("signals.correlate", "normalization", normalization, NORMALIZATIONS)
+    full = core.convolve_complex(y, x, method, 1, norm) if is_complex else core.correlate(y, x, method, norm)
+    return _part(full, mode, "signals.correlate", len(x), len(y))
+
+
+def autocorrelate(x, normalization="none", axis=LAST):
+    """The autocorrelation of real values, 2 n - 1 of them with lag 0 in the middle.
+
+    Parameters
+    ----------
+    x : array_like
+        Real values.
+    normalization : {"none", "unbiased", "biased"}
+        As of `correlate`.
+    axis : int
+        The axis along which to work.
+
+    Returns
+    -------
+    ndarray of float64
+
+    Raises
+    ------
+    ValueError
+        If x is empty, or normalization is none of its words.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.signals.autocorrelate([1.0, 2.0]).round(12)
+    array([2., 5., 2.])
+    """
+    norm = chosen("signals.autocorrelate", "normalization", normalization, NORMALIZATIONS)
+    return along(lambda channel: core.autocorrelate(channel, norm), x, axis)
+
+
+def deconvolve(xy, y):
+    """The sequence whose convolution with y is xy; a remainder stays in it.
+
+    Parameters
+    ----------
+    xy, y : array_like
+        Real values; y not longer than xy.
+
+    Returns
+    -------
+    ndarray of float64
+
+    Raises
+    ------
+    ValueError
+        If an array is empty or y is longer than xy.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.signals.deconvolve([1.0, 1.0, 1.0, -3.0], [1.0, -1.0]).round(12)
+    array([1., 2., 3.])
+    """
+    xy, y, _ = _both("signals.deconvolve", xy, y)
+    if len(y) > len(xy):
+        refuse("signals.deconvolve", "y", "must not be longer than xy", "ErrSizesDisagree")
+    return core.deconvolve(xy, y)
+
+
+def _matrices(function, x, y, method):
+    x, y = as_array(x), as_array(y)
+    if x.ndim != 2 or y.ndim != 2:
+        refuse(function, "x, y", f"two dimensions are needed; {x.ndim} and {y.ndim} came", "ErrSizesDisagree")
+    if method == "auto":
+        method = "fft" if y.size > DIRECT else "direct"
+    return x, y, chosen(function, "method", method, METHODS), "c" in x.dtype.kind + y.dtype.kind
+
+
+def convolve2(x, y, mode="full", method="auto"):
+    r"""The convolution of two matrices.
+
+    .. math:: z_{rc} = \sum_i \sum_j x_{ij} y_{r-i,\,c-j}
+
+    Parameters
+    ----------
+    x, y : array_like
+        Matrices, real or complex.
+    mode : {"full", "same", "valid"}
+        All values; the size of x, from row and column half of those of y on; those where y is wholly on
+        x.
+    method : {"auto", "direct", "fft"}
+        Direct sums or transforms.
+
+    Returns
+    -------
+    ndarray
+
+    Raises
+    ------
+    ValueError
+        If a matrix is empty, y exceeds x with mode "valid", or a word is none of its words.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.signals.convolve2([[1.0, 2.0]], [[1.0], [1.0]])
+    array([[1., 2.],
+           [1., 2.]])
+    """
+    x, y, method, is_complex = _matrices("signals.convolve2", x, y, method)
+    size = chosen("signals.convolve2", "mode", mode, {"full": 0, "same": 1, "valid": 2})
+    return (core.convolve2_complex if is_complex else core.convolve2)(x, y, size, method)
+
+
+def correlate2(x, y, method="auto"):
+    r"""The cross-correlation of two matrices, all lags; lag 0 is in the last row and column of y.
+
+    .. math:: z_{rc} = \sum_i \sum_j x_{ij}\, \overline{y_{i - r + m - 1,\, j - c + n - 1}}
+
+    Parameters
+    ----------
+    x, y : array_like
+        Matrices, real or complex.
+    method : {"auto", "direct", "fft"}
+        Direct sums or transforms.
+
+    Returns
+    -------
+    ndarray
+
+    Raises
+    ------
+    ValueError
+        If a matrix is empty, or method is none of its words.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.signals.correlate2([[1.0, 2.0]], [[1.0, 1.0]])
+    array([[1., 3., 2.]])
+    """
+    x, y, method, is_complex = _matrices("signals.correlate2", x, y, method)
+    return (core.correlate2_complex if is_complex else core.correlate2)(y, x, method)

@@ -1,0 +1,719 @@
+r"""Spectra of measured signals, in units: densities, transfer functions and coherence, spectrograms,
+envelopes.
+
+Arguments have the names, order and defaults of `scipy.signal`. Segments of `nperseg` values, each under a
+window, follow each other with `noverlap` values in common.
+"""
+
+import numpy as np
+
+from . import windows
+from .topical import LAST, Result, along, chosen, count_of, either, refuse, result, served, whole_number
+from .topical.axes import as_array, is_pandas
+
+__all__ = ["CrossSpectrum", "Spectrogram", "Spectrum", "TransferFunction", "analytic", "coherence", "csd",
+           "envelope", "instantaneous_frequency", "instantaneous_phase", "periodogram", "power",
+           "spectrogram", "transfer_function", "welch"]
+
+core = served("spectra")
+
+AT_ONCE = 1 << 20  # values of segments in hand
+DETRENDS = {"constant": "constant", "linear": "linear", "none": None, False: None}
+SCALINGS = {"density": "density", "spectrum": "spectrum"}
+AVERAGES = {"mean": "mean", "median": "median"}
+
+
+@result
+class Spectrum(Result):
+    """A spectrum of power; unpacked, frequencies and values.
+
+    Attributes
+    ----------
+    frequencies : ndarray
+        In the unit of fs.
+    values : ndarray
+        The square of the unit of x by the unit of fs, or without the latter with scaling "spectrum".
+    resolution : float
+        The equivalent noise bandwidth of a line, in the unit of fs.
+    segments : int
+        How many segments were averaged.
+    scaling : str
+        "density" or "spectrum".
+    """
+
+    frequencies: np.ndarray
+    values: np.ndarray
+    resolution: float
+    segments: int
+    scaling: str
+    _unpacked = ("frequencies", "values")
+
+    @property
+    def amplitude(self):
+        """The square root of the values: unit of x by the root of that of fs for a density."""
+        return np.sqrt(self.values)
+
+    @property
+    def decibels(self):
+        """10 lg of the values."""
+        with np.errstate(divide="ignore"):
+            return 10 * np.log10(self.values)
+
+    def power(self, low=-np.inf, high=np.inf):
+        """The power between two frequencies, the lines at both included: of the whole spectrum the mean
+        square of what was detrended. Only of a density with its channels along the first axes."""
+        if self.scaling != "density":
+            refuse("spectra.Spectrum.power", "self", "only a density has a power in a band")
+        inside = (self.frequencies >= low) & (self.frequencies <= high)
+        width = abs(self.frequencies[1] - self.frequencies[0]) if len(self.frequencies) > 1 else 1.0
+        return self.values[..., inside].sum(-1) * width
+
+    def plot(self, axes=None):
+        """Draws the values in decibels with matplotlib; returns the axes."""
+        if axes is None:
+            from matplotlib import pyplot
+            axes = pyplot.subplots()[1]
+        axes.plot(self.frequencies, self.decibels.T)
+        axes.set(xlabel="frequency", ylabel="density (dB)" if self.scaling == "density" else "power (dB)")
+        axes.grid(True, alpha=0.3)
+        return axes
+
+
+@result
+class CrossSpectrum(Result):
+    """A cross spectrum; unpacked, frequencies and complex values.
+
+    Attributes
+    ----------
+    frequencies : ndarray
+        In the unit of fs.
+    values : ndarray of complex128
+        The mean of conj(X) Y, in the units of x and y by that of fs.
+    resolution : float
+        The equivalent noise bandwidth of a line, in the unit of fs.
+    segments : int
+        How many segments were averaged.
+    """
+
+    frequencies: np.ndarray
+    values: np.ndarray
+    resolution: float
+    segments: int
+    _unpacked = ("frequencies", "values")
+
+
+@result
+class TransferFunction(Result):
+    """What is between an input and an output; unpacked, frequencies and complex gains.
+
+    Attributes
+    ----------
+    frequencies : ndarray
+        In the unit of fs.
+    values : ndarray of complex128
+        The gain, in units of y by units of x.
+    coherence : ndarray
+        From 0 to 1, the part of the output's power that the input explains.
+    resolution : float
+        The equivalent noise bandwidth of a line, in the unit of fs.
+    segments : int
+        How many segments were averaged.
+    """
+
+    frequencies: np.ndarray
+    values: np.ndarray
+    coherence: np.ndarray
+    resolution: float
+    segments: int
+    _unpacked = ("frequencies", "values")
+
+    @property
+    def error(self):
+        r"""The relative standard error of the magnitude,
+        :math:`\sqrt{(1 - \gamma^2) / (2 n \gamma^2)}` for n independent segments (J. S. Bendat and A. G.
+        Piersol, "Random data", 1971); overlapping segments count in full here."""
+        with np.errstate(divide="ignore", invalid="ignore"):
+            return np.sqrt((1 - self.coherence) / (2 * self.segments * self.coherence))
+
+
+@result
+class Spectrogram(Result):
+    """Spectra of segments; unpacked, frequencies, times and values.
+
+    Attributes
+    ----------
+    frequencies : ndarray
+        In the unit of fs.
+    times : ndarray
+        The middles of the segments.
+    values : ndarray
+        One column for each time.
+    resolution : float
+        The equivalent noise bandwidth of a line, in the unit of fs.
+    """
+
+    frequencies: np.ndarray
+    times: np.ndarray
+    values: np.ndarray
+    resolution: float
+    _unpacked = ("frequencies", "times", "values")
+
+    def plot(self, axes=None):
+        """Draws the values in decibels as colours with matplotlib; returns the axes."""
+        if axes is None:
+            from matplotlib import pyplot
+            axes = pyplot.subplots()[1]
+        shown = 10 * np.log10(np.maximum(self.values, np.finfo(float).tiny))
+        axes.pcolormesh(self.times, self.frequencies, shown, shading="nearest")
+        axes.set(xlabel="time", ylabel="frequency")
+        return axes
+
+
+class _Segments:
+    """How a signal is cut, and what a line of its spectra is worth."""
+
+    def __init__(self, function, n, fs, window, nperseg, noverlap, nfft, detrend, scaling, is_complex):
+        if n < 1:
+            refuse(function, "x", "is empty", "ErrEmptyInput")
+        if not fs > 0:
+            refuse(function, "fs", f"must be above 0; {fs} came", "ErrSamplingNotPositive")
+        if nperseg is None:
+            nperseg = min(256, n) if isinstance(window, (str, tuple)) else len(window)
+        self.length = min(whole_number(function, "nperseg", nperseg, 1), n)
+        noverlap = self.length // 2 if noverlap is None else whole_number(function, "noverlap", noverlap, 0)
+        if noverlap >= self.length:
+            refuse(function, "noverlap", f"must be below the length of a segment, {self.length}; {noverlap} "
+                   "came", "ErrSizesDisagree")
+        self.step = self.length - noverlap
+        self.size = self.length if nfft is None else whole_number(function, "nfft", nfft, 1)
+        if self.size < self.length:
+            refuse(function, "nfft", f"must be at least the length of a segment, {self.length}; {nfft} came",
+                   "ErrSizesDisagree")
+        self.count = (n - noverlap) // self.step
+        self.detrend = chosen(function, "detrend", detrend, DETRENDS)
+        self.scaling = chosen(function, "scaling", scaling, SCALINGS)
+        self.window = windows.get(window, self.length)
+        squares, total = np.sum(self.window**2), np.sum(self.window)
+        self.scale = 1 / (fs * squares) if self.scaling == "density" else 1 / total**2
+        self.resolution = fs * squares / total**2
+        self.is_complex, self.fs = is_complex, fs
+        self.frequencies = (np.fft.fftfreq if is_complex else np.fft.rfftfreq)(self.size, 1 / fs)
+        self.times = (np.arange(self.count) * self.step + self.length / 2) / fs
+        if not is_complex:  # the negative frequencies count with the positive ones
+            self.scale = np.full(len(self.frequencies), 2 * self.scale)
+            self.scale[0] /= 2
+            if self.size % 2 == 0 and self.size > 1:
+                self.scale[-1] /= 2
+
+    def _trendless(self, rows):
+        if self.detrend is None:
+            return rows
+        rows = rows - rows.mean(-1, keepdims=True)
+        if self.detrend == "linear" and self.length > 1:
+            t = np.arange(self.length) - (self.length - 1) / 2
+            rows -= (rows @ t)[:, None] * (t / (t @ t))
+        return rows
+
+    def spectra(self, x):
+        """The transforms of the segments, some rows at a time."""
+        x = np.ascontiguousarray(x, complex if self.is_complex else float)
+        cut = np.lib.stride_tricks.sliding_window_view(x, self.length)[::self.step]
+        rows_at_once = max(1, AT_ONCE // self.size)
+        half = len(self.frequencies)
+        padded = self.size > self.length
+        transform = core.welch_complex if self.is_complex else core.welch
+        sized = core.welch_complex_sized if self.is_complex else core.welch_sized
+        for first in range(0, len(cut), rows_at_once):
+            rows = self._trendless(cut[first:first + rows_at_once]) * self.window
+            found = np.empty((len(rows), half), complex)
+            for row, place in zip(rows, found):
+                place[:] = (sized(row, 0, self.size, 0) if padded else transform(row))[:half]
+            yield found
+
+    def powers(self, x):
+        return np.concatenate([found.real**2 + found.imag**2 for found in self.spectra(x)])
+
+    def sums(self, x, y):
+        """The sums of |X|^2, |Y|^2 and conj(X) Y over the segments."""
+        xx, yy, xy = 0.0, 0.0, 0.0
+        for of_x, of_y in zip(self.spectra(x), self.spectra(y)):
+            xx = xx + np.sum(of_x.real**2 + of_x.imag**2, 0)
+            yy = yy + np.sum(of_y.real**2 + of_y.imag**2, 0)
+            xy = xy + np.sum(of_x.conj() * of_y, 0)
+        factor = self.scale / self.count
+        return xx * factor, yy * factor, xy * factor
+
+
+def _is_complex(x):
+    return (x.to_numpy() if is_pandas(x) else as_array(x)).dtype.kind == "c"
+
+
+def _median_bias(n):
+    """The mean of the median of n values of an exponential distribution of mean 1."""
+    k = 2 * np.arange(1.0, (n - 1) // 2 + 1)
+    return 1 + np.sum(1 / (k + 1) - 1 / k)
+
+
+def welch(x, fs=1.0, window="hann", nperseg=None, noverlap=None, nfft=None, detrend="constant",
+          scaling="density", average="mean", axis=LAST):
+    r"""The density of power by the mean over overlapping segments.
+
+    .. math:: P_k = \frac{2}{f_s \sum w^2} \Big\langle |X_k|^2 \Big\rangle
+
+    with the factor 2 for real values at all frequencies but 0 and fs / 2. P. D. Welch, "The use of fast
+    Fourier transform for the estimation of power spectra", 1967.
+
+    Parameters
+    ----------
+    x : array_like
+        Real or complex values; complex ones have a two-sided spectrum in the order of `qx.fft.fft`.
+    fs : float
+        The sampling rate.
+    window : str, tuple or array_like
+        As of `qx.windows.get`.
+    nperseg : int, optional
+        Values in a segment; 256, or as many as there are.
+    noverlap : int, optional
+        Values that neighbours have in common; half a segment by default.
+    nfft : int, optional
+        Length of the transforms, with zeros behind the segments.
+    detrend : {"constant", "linear", "none"}
+        What is taken from each segment: its mean, its line, nothing.
+    scaling : {"density", "spectrum"}
+        Power by frequency, or the power of a line: of a tone its mean square.
+    average : {"mean", "median"}
+        Over the segments; the median, corrected for its bias, ignores a few disturbed ones.
+    axis : int
+        The axis of time.
+
+    Returns
+    -------
+    Spectrum
+
+    Raises
+    ------
+    ValueError
+        If x is empty, noverlap is not below nperseg, nfft is, or a word is none of its words.
+
+    Examples
+    --------
+    >>> import numpy as np, qx
+    >>> x = np.sin(2 * np.pi * 50 * np.arange(1000) / 1000)
+    >>> found = qx.spectra.welch(x, 1000, nperseg=500)
+    >>> float(found.frequencies[found.values.argmax()]), round(found.power(40, 60), 6)
+    (50.0, 0.5)
+    """
+    average = chosen("spectra.welch", "average", average, AVERAGES)
+    cut = _Segments("spectra.welch", count_of(x, axis), fs, window, nperseg, noverlap, nfft, detrend,
+                    scaling, _is_complex(x))
+
+    def of_channel(channel):
+        powers = cut.powers(channel)
+        if average == "median":
+            return np.median(powers, 0) / _median_bias(len(powers)) * cut.scale
+        return powers.mean(0) * cut.scale
+
+    return Spectrum(cut.frequencies, along(of_channel, x, axis), cut.resolution, cut.count, cut.scaling)
+
+
+def periodogram(x, fs=1.0, window="boxcar", nfft=None, detrend="constant", scaling="density", axis=LAST):
+    """The density of power of all values at once: `welch` with one segment.
+
+    Parameters
+    ----------
+    x : array_like
+        Real or complex values.
+    fs : float
+        The sampling rate.
+    window : str, tuple or array_like
+        As of `qx.windows.get`.
+    nfft : int, optional
+        Length of the transform, with zeros behind the values.
+    detrend : {"constant", "linear", "none"}
+        What is taken from the values before.
+    scaling : {"density", "spectrum"}
+        Power by frequency, or the power of a line.
+    axis : int
+        The axis of time.
+
+    Returns
+    -------
+    Spectrum
+
+    Raises
+    ------
+    ValueError
+        As of `welch`.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.spectra.periodogram([1.0, -1.0, 1.0, -1.0]).values
+    array([0., 0., 4.])
+    """
+    return welch(x, fs, window, count_of(x, axis), 0, nfft, detrend, scaling, axis=axis)
+
+
+def power(x, axis=LAST):
+    r"""The two-sided power spectrum without a window: :math:`|X_k|^2 / n^2`, whose sum is the mean
+    square.
+
+    Parameters
+    ----------
+    x : array_like
+        Real or complex values.
+    axis : int
+        The axis along which to transform.
+
+    Returns
+    -------
+    ndarray of float64
+        In the order of `qx.fft.fft`.
+
+    Raises
+    ------
+    ValueError
+        If x is empty.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.spectra.power([1.0, -1.0, 1.0, -1.0])
+    array([0., 0., 1., 0.])
+    """
+    return either(core.power, core.power_complex, x, axis)
+
+
+def _pair(function, x, y, fs, window, nperseg, noverlap, nfft, detrend, axis):
+    """The segments of two signals and their sums, channel by channel."""
+    x, y = as_array(x), as_array(y)
+    if x.shape != y.shape:
+        refuse(function, "x, y", f"must have one shape; {x.shape} and {y.shape} came", "ErrSizeMismatch")
+    is_complex = x.dtype.kind == "c" or y.dtype.kind == "c"
+    n = count_of(x, axis)
+    cut = _Segments(function, n, fs, window, nperseg, noverlap, nfft, detrend, "density", is_complex)
+    both = np.concatenate([x, y], axis)
+    return cut, along(lambda channel: cut.sums(channel[:n], channel[n:]), both, axis)
+
+
+def csd(x, y, fs=1.0, window="hann", nperseg=None, noverlap=None, nfft=None, detrend="constant", axis=LAST):
+    r"""The cross density of power: the mean of :math:`\overline{X_k} Y_k`, scaled as that of `welch`.
+
+    Parameters
+    ----------
+    x, y : array_like
+        Two signals of one shape.
+    fs : float
+        The sampling rate.
+    window : str, tuple or array_like
+        As of `qx.windows.get`.
+    nperseg : int, optional
+        Values in a segment; 256, or as many as there are.
+    noverlap : int, optional
+        Values that neighbours have in common; half a segment by default.
+    nfft : int, optional
+        Length of the transforms.
+    detrend : {"constant", "linear", "none"}
+        What is taken from each segment.
+    axis : int
+        The axis of time.
+
+    Returns
+    -------
+    CrossSpectrum
+
+    Raises
+    ------
+    ValueError
+        As of `welch`, and if x and y differ in shape.
+
+    Examples
+    --------
+    >>> import qx
+    >>> x = qx.noise.gaussian(4096, seed=1)
+    >>> bool(abs(qx.spectra.csd(x, x).values.imag).max() == 0)
+    True
+    """
+    cut, (_, _, xy) = _pair("spectra.csd", x, y, fs, window, nperseg, noverlap, nfft, detrend, axis)
+    return CrossSpectrum(cut.frequencies, xy, cut.resolution, cut.count)
+
+
+def transfer_function(x, y, fs=1.0, window="hann", nperseg=None, noverlap=None, nfft=None,
+                      detrend="constant", estimator="H1", axis=LAST):
+    r"""The gain from an input x to an output y, with the coherence.
+
+    .. math:: H_1 = \frac{\langle\overline{X} Y\rangle}{\langle|X|^2\rangle},\quad
+              H_2 = \frac{\langle|Y|^2\rangle}{\langle\overline{Y} X\rangle},\quad
+              \gamma^2 = \frac{|\langle\overline{X} Y\rangle|^2}{\langle|X|^2\rangle\langle|Y|^2\rangle}
+
+    Parameters
+    ----------
+    x, y : array_like
+        Input and output, of one shape.
+    fs : float
+        The sampling rate.
+    window : str, tuple or array_like
+        As of `qx.windows.get`.
+    nperseg : int, optional
+        Values in a segment; 256, or as many as there are.
+    noverlap : int, optional
+        Values that neighbours have in common; half a segment by default.
+    nfft : int, optional
+        Length of the transforms.
+    detrend : {"constant", "linear", "none"}
+        What is taken from each segment.
+    estimator : {"H1", "H2"}
+        Without bias by noise at the output, or by noise at the input.
+    axis : int
+        The axis of time.
+
+    Returns
+    -------
+    TransferFunction
+
+    Raises
+    ------
+    ValueError
+        As of `welch`, and if x and y differ in shape.
+
+    Examples
+    --------
+    >>> import qx
+    >>> x = qx.noise.gaussian(20000, seed=1)
+    >>> f = qx.filters.butterworth(2, 0.1)
+    >>> found = qx.spectra.transfer_function(x, f(x), nperseg=512)
+    >>> bool(abs(found.values - f.response(found.frequencies).values).max() < 0.02)
+    True
+    """
+    which = chosen("spectra.transfer_function", "estimator", estimator, {"H1": 1, "H2": 2})
+    cut, (xx, yy, xy) = _pair("spectra.transfer_function", x, y, fs, window, nperseg, noverlap, nfft,
+                              detrend, axis)
+    with np.errstate(divide="ignore", invalid="ignore"):
+        values = xy / xx if which == 1 else yy / xy.conj()
+        found = (xy.real**2 + xy.imag**2) / (xx * yy)
+    return TransferFunction(cut.frequencies, values, found.real, cut.resolution, cut.count)
+
+
+def coherence(x, y, fs=1.0, window="hann", nperseg=None, noverlap=None, nfft=None, detrend="constant",
+              axis=LAST):
+    """The coherence of two signals: from 0 to 1, the part of the power of one that the other explains
+    linearly; unpacked, frequencies and values. With a single segment it is 1.
+
+    Parameters
+    ----------
+    x, y : array_like
+        Two signals of one shape.
+    fs : float
+        The sampling rate.
+    window : str, tuple or array_like
+        As of `qx.windows.get`.
+    nperseg : int, optional
+        Values in a segment; 256, or as many as there are.
+    noverlap : int, optional
+        Values that neighbours have in common; half a segment by default.
+    nfft : int, optional
+        Length of the transforms.
+    detrend : {"constant", "linear", "none"}
+        What is taken from each segment.
+    axis : int
+        The axis of time.
+
+    Returns
+    -------
+    Spectrum
+
+    Raises
+    ------
+    ValueError
+        As of `welch`, and if x and y differ in shape.
+
+    Examples
+    --------
+    >>> import qx
+    >>> x = qx.noise.gaussian(4096, seed=1)
+    >>> bool(abs(qx.spectra.coherence(x, 2 * x).values - 1).max() < 1e-12)
+    True
+    """
+    found = transfer_function(x, y, fs, window, nperseg, noverlap, nfft, detrend, axis=axis)
+    return Spectrum(found.frequencies, found.coherence, found.resolution, found.segments, "coherence")
+
+
+def spectrogram(x, fs=1.0, window=("tukey", 0.25), nperseg=None, noverlap=None, nfft=None,
+                detrend="constant", scaling="density", axis=LAST):
+    """The densities of power of segments, one after the other.
+
+    Parameters
+    ----------
+    x : array_like
+        Real or complex values.
+    fs : float
+        The sampling rate.
+    window : str, tuple or array_like
+        As of `qx.windows.get`.
+    nperseg : int, optional
+        Values in a segment; 256, or as many as there are.
+    noverlap : int, optional
+        Values that neighbours have in common; an eighth of a segment by default.
+    nfft : int, optional
+        Length of the transforms.
+    detrend : {"constant", "linear", "none"}
+        What is taken from each segment.
+    scaling : {"density", "spectrum"}
+        Power by frequency, or the power of a line.
+    axis : int
+        The axis of time; frequencies and times are the last two axes of the result.
+
+    Returns
+    -------
+    Spectrogram
+
+    Raises
+    ------
+    ValueError
+        As of `welch`.
+
+    Examples
+    --------
+    >>> import qx
+    >>> found = qx.spectra.spectrogram(qx.signals.chirp(8000, 0, 400, fs=1000), 1000)
+    >>> found.frequencies[found.values.argmax(0)[[0, -1]]].round()
+    array([  8., 387.])
+    """
+    n = count_of(x, axis)
+    if noverlap is None:
+        length = min(256 if nperseg is None else nperseg, n) if isinstance(window, (str, tuple)) else len(window)
+        noverlap = int(length) // 8
+    cut = _Segments("spectra.spectrogram", n, fs, window, nperseg, noverlap, nfft, detrend, scaling,
+                    _is_complex(x))
+    array = x.to_numpy().T if is_pandas(x) and axis is LAST else np.moveaxis(as_array(x), axis, -1)
+    size = cut.count * len(cut.frequencies)
+    flat = along(lambda channel: (cut.powers(channel) * cut.scale).T.ravel(), array)
+    assert flat.shape[-1] == size
+    return Spectrogram(cut.frequencies, cut.times,
+                       flat.reshape(*flat.shape[:-1], len(cut.frequencies), cut.count), cut.resolution)
+
+
+def analytic(x, axis=LAST):
+    """The analytic signal: x and, as imaginary part, its Hilbert transform.
+
+    Parameters
+    ----------
+    x : array_like
+        Real values.
+    axis : int
+        The axis of time.
+
+    Returns
+    -------
+    ndarray of complex128
+
+    Raises
+    ------
+    ValueError
+        If x is empty.
+
+    Examples
+    --------
+    >>> import qx
+    >>> abs(qx.spectra.analytic([1.0, 0.0, -1.0, 0.0])).round(12)
+    array([1., 1., 1., 1.])
+    """
+    return along(lambda channel: channel + 1j * core.analytic(channel), x, axis)
+
+
+def envelope(x, axis=LAST):
+    """The envelope: the magnitude of the analytic signal, about the mean of x.
+
+    Parameters
+    ----------
+    x : array_like
+        Real values.
+    axis : int
+        The axis of time.
+
+    Returns
+    -------
+    ndarray of float64
+        What is to be added to the mean at each time.
+
+    Raises
+    ------
+    ValueError
+        If x is empty.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.spectra.envelope([4.0, 3.0, 2.0, 3.0]).round(12)
+    array([1., 1., 1., 1.])
+    """
+    return along(lambda channel: np.abs(_about_mean(channel)), x, axis)
+
+
+def _about_mean(channel):
+    found = core.analytic(channel)
+    return (channel - np.mean(channel)) + 1j * found
+
+
+def instantaneous_phase(x, axis=LAST):
+    """The phase of the analytic signal about the mean of x, in radians, without jumps.
+
+    Parameters
+    ----------
+    x : array_like
+        Real values.
+    axis : int
+        The axis of time.
+
+    Returns
+    -------
+    ndarray of float64
+
+    Raises
+    ------
+    ValueError
+        If x is empty.
+
+    Examples
+    --------
+    >>> import qx
+    >>> (qx.spectra.instantaneous_phase([1.0, 0.0, -1.0, 0.0, 1.0, 0.0, -1.0, 0.0])[-1] / 3.14159265).round(6)
+    3.5
+    """
+    return along(lambda channel: core.instantaneous_phase(np.angle(_about_mean(channel)), 0), x, axis)
+
+
+def instantaneous_frequency(x, fs=1.0, axis=LAST):
+    """The slope of the instantaneous phase, over two intervals around each value and over one at the ends.
+
+    Parameters
+    ----------
+    x : array_like
+        Real values, at least 2.
+    fs : float
+        The sampling rate.
+    axis : int
+        The axis of time.
+
+    Returns
+    -------
+    ndarray of float64
+        In the unit of fs.
+
+    Raises
+    ------
+    ValueError
+        If x has fewer than 2 values.
+
+    Examples
+    --------
+    >>> import qx
+    >>> x = qx.signals.chirp(4000, 50, 150, fs=1000)
+    >>> found = qx.spectra.instantaneous_frequency(x, 1000)
+    >>> bool(abs(found[2000] - 100) < 0.5)
+    True
+    """
+    if count_of(x, axis) < 2:
+        refuse("spectra.instantaneous_frequency", "x", "at least two values are needed", "ErrFewerThanTwo")
+    return along(lambda channel: np.gradient(
+        core.instantaneous_phase(np.angle(_about_mean(channel)), 0)) * (fs / (2 * np.pi)), x, axis)
