@@ -61,12 +61,18 @@ def rule(export, name):
     return ""
 
 
+def kind_of(name, code=0):
+    """The class of exception for a code."""
+    if name in _MATRIX:
+        return MatrixError
+    if name in _MEMORY or code in HOST_FAILURES:
+        return OutOfMemory
+    return QxError if name in _OTHERS or not name.startswith("Err") else ArgumentError
+
+
 def failure(export, code, results=None, place=""):
     """The exception for a code, of the class that fits it."""
-    name = library().error_name(code)
-    kind = (MatrixError if name in _MATRIX else OutOfMemory if name in _MEMORY or code in HOST_FAILURES
-            else QxError if name in _OTHERS or not name.startswith("Err") else ArgumentError)
-    return kind(export, code, results, place)
+    return kind_of(library().error_name(code), code)(export, code, results, place)
 
 
 class QxWarning(UserWarning):

@@ -51,7 +51,7 @@ class Spectra(unittest.TestCase):
         line = spectra.welch(x, 1000, ("kaiser", 12), 2000, scaling="spectrum")
         self.assertAlmostEqual(line.amplitude.max(), np.sqrt(2), 2)
         self.assertRaises(ValueError, line.power)
-        self.assertIn("frequencies  1001: [0. 0.5 ... 499.5 500.]", repr(found))
+        self.assertIn("frequencies  1001: [ 0. 0.5 ... 499.5 500. ]", repr(found))
         self.assertEqual(len(found.plot().lines), 1)
 
     def test_two_signals(self):

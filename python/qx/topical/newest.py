@@ -9,7 +9,8 @@ import importlib
 from ..calls import export, hint
 from ..library import library
 
-TOPICS = ("filters", "fft", "windows", "spectra", "signals", "noise", "multirate")  # in the order in which they are shown
+TOPICS = ("filters", "fft", "windows", "spectra", "signals", "noise", "multirate", "linalg", "poly",
+          "interpolate", "calculus", "special", "coordinates")  # in the order in which they are shown
 
 NEWEST = {
     "filters": {
@@ -65,6 +66,85 @@ NEWEST = {
         "moving_sum": "ReCascadedMovingAverageH", "moving_sum_complex": "CxCascadedMovingAverageH",
         "cic_decimate": "CICDecimatorByMovH", "cic_interpolate": "CICInterpolatorByMovH",
         "shift_frequency": "ReComplexModulatorH", "shift_frequency_complex": "CxComplexModulatorH",
+    },
+    "linalg": {
+        "lu": "LU_head", "lu_complex": "CxLU_head", "solve": "LULinEqs_head", "solve_complex":
+        "CxLULinEqs_head", "solve_inverse": "LUInvMatrix_head", "solve_inverse_complex":
+        "CxLUInvMatrix_head", "solve_triangular": "TriEqsSetDri_head", "solve_triangular_complex":
+        "CxTriEqsSetDri_head", "solve_positive": "EqsSetByCholeskyDri_head",
+        "solve_positive_complex": "CxEqsSetByCholeskyDri_head", "lstsq": "EqsSetBySVDDri82_head",
+        "lstsq_complex": "CxEqsSetBySVDDri82_head", "pinv": "PseudoInverse_head", "pinv_complex":
+        "CxPseudoInverse_head", "det": "Determinant_head", "det_complex": "CxDeterminant_head",
+        "trace": "Trace_head", "trace_complex": "CxTrace_head", "norm": "Norm_head",
+        "norm_complex": "CxNorm_head", "norm_vector": "vectorNormH", "norm_vector_complex":
+        "CxVectorNormH", "cond": "CondNumber_head", "cond_complex": "CxCondNumber_head",
+        "matrix_rank": "Rank_head", "matrix_rank_complex": "CxRank_head", "eig":
+        "EigenValueVector_head", "eig_complex": "CxEigenValueVector_head", "eig_general":
+        "GenEigenEx_head", "eig_general_complex": "CxGenEigenEx_head", "eigh":
+        "SymEvectorEvalue_head", "svd": "SVDEx_head", "svd_complex": "CxSVDEx_head", "svdvals":
+        "SVDS_head", "svdvals_complex": "CxSVDS_head", "qr": "QRDecH", "qr_complex": "CxQRDecH",
+        "cholesky": "FullCholesky_head", "cholesky_complex": "CxFullCholesky_head", "schur":
+        "Schur80_head", "schur_complex": "CxSchur80_head", "qz": "QZ80_head", "qz_complex":
+        "CxQZ80_head", "hessenberg": "Hessenberg_head", "hessenberg_complex": "CxHessenberg_head",
+        "expm": "MatrixExp_head", "expm_complex": "CxMatrixExp_head", "logm": "MatrixLn_head",
+        "logm_complex": "CxMatrixLn_head", "sqrtm": "MatrixSqrtH", "sqrtm_complex":
+        "CxMatrixSqrt_head", "matrix_power": "MatrixPower_head", "matrix_power_complex":
+        "CxMatrixPower_head", "solve_sylvester": "Sylvester2011_head", "solve_sylvester_complex":
+        "CxSylvester2011_head", "solve_lyapunov": "Lyapunov2011_head", "solve_lyapunov_complex":
+        "CxLyapunov2011_head", "solve_banded": "BandEqsDriH", "solve_banded_complex":
+        "CxBandEqsDriH", "solve_banded_many": "BandEqsSetDriH", "solve_banded_many_complex":
+        "CxBandEqsSetDriH", "charpoly": "MatrixCharacteristicPoly_head", "charpoly_complex":
+        "CxMatrixCharacteristicPoly_head", "is_positive_definite": "CheckPosdef_head",
+        "is_positive_definite_complex": "CxCheckPosdef_head", "kron": "KroneckerProd_H",
+        "kron_complex": "CxKroneckerProd_H", "toeplitz": "SpecialMatrix_head", "toeplitz_complex":
+        "CxSpecialMatrix_head",
+    },
+    "poly": {
+        "add": "AddPolyH", "add_complex": "CxAddPolyH", "subtract": "SubtractPolyH",
+        "subtract_complex": "CxSubtractPolyH", "multiply": "MultiplyPolyH",
+        "multiply_complex": "CxMultiplyPolyH", "divide": "DividePolyH",
+        "divide_complex": "CxDividePolyH", "gcd": "PolyGCD_H", "gcd_complex": "CxPolyGCD_H",
+        "compose": "PolyComposeH", "compose_complex": "CxPolyComposeH",
+        "derivative": "PolyDerivativeH", "derivative_complex": "CxPolyDerivativeH",
+        "integral": "PolyIntegralH", "integral_complex": "CxPolyIntegralH",
+        "multiple_roots": "MultPolyRoots_head", "multiple_roots_complex": "CxMultPolyRoots_head",
+        "lcm": "PolyLCM_H", "evaluate": "PolyEv", "evaluate_complex": "CxPolyEv",
+        "evaluate_matrix": "EvPoly2D", "evaluate_matrix_complex": "CxEvPoly2D",
+        "from_roots": "PolyFromRootsH", "from_roots_complex": "CxPolyFromRootsH",
+        "partial_fractions": "PartialFractionsH",
+    },
+    "interpolate": {
+        "CubicSpline": "Spline_head", "polynomial": "PolyInterp_head",
+        "rational": "RatInterp_head",
+    },
+    "calculus": {
+        "integrate": "NumerIntegration_2017_head", "integrate2": "NumerIntegration2D_2017_head",
+        "cumulative": "Integral_2017", "derivative": "Derivative85",
+    },
+    "special": {
+        "gamma": "QX_Gamma_85", "gammaln": "QX_LnGamma", "gammainc": "QX_Gamma_85",
+        "gammaincc": "QX_GammaC", "beta": "QX_Beta_85", "betainc": "QX_Beta_85",
+        "factorial": "QX_Fact", "factorialln": "QX_LnFact", "digamma": "QX_Psi",
+        "zeta": "QX_Zeta", "stirling": "QX_Stirling", "erf": "QX_Erf", "erfc": "QX_ErfC",
+        "expn": "QX_ExpI", "sici": "QX_SinI", "sici_cosine": "QX_CosI", "shichi": "QX_SinhI",
+        "shichi_cosine": "QX_CoshI", "spence": "QX_Diln", "dawsn": "QX_Dawson",
+        "fresnel": "QX_FresnelIntegrals", "ellipk": "QX_Elliptic1_85",
+        "ellipkinc": "QX_Elliptic1_85", "ellipe": "QX_Elliptic2_85",
+        "ellipeinc": "QX_Elliptic2_85", "ellipj": "QX_EllipticJ", "hyp2f1": "QX_Gauss_2011",
+        "hyp1f1": "QX_Kummer", "hyperu": "QX_Tricomi", "jv": "QX_BesselJr",
+        "jv_complex": "QX_CxBesselJr", "yv": "QX_BesselYr", "yv_complex": "QX_CxBesselYr",
+        "iv": "QX_BesselIr", "iv_complex": "QX_CxBesselIr", "kn": "QX_BesselKn",
+        "kv": "QX_CxBesselKr", "hankel1": "QX_CxBesselH1r", "hankel2": "QX_CxBesselH2r",
+        "spherical_jn": "QX_BesselJs", "spherical_yn": "QX_BesselYs", "airy": "QX_Airy",
+        "airy_ai": "QX_CxAiryAi", "airy_aip": "QX_CxAiryAiP", "airy_bi": "QX_CxAiryBi",
+        "airy_bip": "QX_CxAiryBiP", "kelvin": "QX_KelvinI", "kelvin_k": "QX_KelvinK",
+        "struve": "QX_Struve", "pbdv": "QX_ParabolicCylinder",
+    },
+    "coordinates": {
+        "rotate2": "CoordRotation2D_head", "rotate": "CoordRotationDirection_head",
+        "rotate_euler": "CoordRotationEuler2011_head",
+        "euler_to_matrix": "Euler2Direction2011_head",
+        "matrix_to_euler": "Direction2Euler2011_head", "convert": "CoordConversion_head",
     },
 }
 

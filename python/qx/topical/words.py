@@ -4,12 +4,12 @@ import difflib
 import operator
 
 from ..library import library
-from ..outcomes import ArgumentError
+from ..outcomes import kind_of
 
 
 def refuse(function, argument, rule, name="ErrInvalidSelector"):
-    """Raises an ArgumentError that names function, argument and rule, with the code of that name."""
-    raise ArgumentError(f"qx.{function}", library().catalogue["codes"][name], None, "",
+    """Raises the exception for the code of that name, which names function, argument and rule."""
+    raise kind_of(name)(f"qx.{function}", library().catalogue["codes"][name], None, "",
                         f"qx.{function}: {argument}: {rule} ({name})")
 
 

@@ -1,0 +1,479 @@
+"""Integrals and derivatives of samples and of functions, and from acceleration to displacement.
+"""
+
+import math
+
+import numpy as np
+
+from .topical import LAST, Result, along, chosen, refuse, result, served, whole_number
+from .topical.axes import as_array
+
+__all__ = ["Quadrature", "cumulative", "derivative", "displacement", "integrate", "integrate2", "quad",
+           "simpson", "trapezoid", "velocity"]
+
+core = served("calculus")
+
+RULES = {"trapezoid": 0, "simpson": 1, "simpson38": 2, "boole": 3, "left": 4, "right": 5}
+DERIVATIVES = {"central": 0, "five-point": 1, "forward": 2, "backward": 3}
+
+
+def _step(function, x, dx):
+    """The distance between samples: dx, or that of the evenly spaced x."""
+    if x is None:
+        if not dx > 0:
+            refuse(function, "dx", f"must be above 0; {dx} came", "ErrSamplingNotPositive")
+        return float(dx)
+    x = as_array(x).astype(float)
+    steps = np.diff(x)
+    if x.ndim != 1 or not len(steps) or not steps[0] > 0 or \
+            np.abs(steps - steps.mean()).max() > 1e-9 * np.abs(x).max(initial=0) + 1e-12 * steps[0]:
+        refuse(function, "x", "must be evenly spaced and rise", "ErrAbscissaeOrder")
+    return float((x[-1] - x[0]) / len(steps))
+
+
+@result
+class Quadrature(Result):
+    """The integral of a function; unpacked, value and error.
+
+    Attributes
+    ----------
+    value : float or complex
+        The integral.
+    error : float
+        An estimate of its error, mostly far above it.
+    evaluations : int
+        At how many points the function was asked.
+    """
+
+    value: float
+    error: float
+    evaluations: int
+    _unpacked = ("value", "error")
+
+
+def trapezoid(y, x=None, dx=1.0, axis=LAST):
+    """The integral by trapezoids; here x may be spaced as it likes.
+
+    Parameters
+    ----------
+    y : array_like
+        Samples.
+    x : array_like, optional
+        Where the samples are, evenly spaced.
+    dx : float
+        The distance between samples, where x is not given.
+    axis : int
+        The axis along which to work.
+
+    Returns
+    -------
+    float or ndarray
+
+    Raises
+    ------
+    ValueError
+        If there are too few samples for the rule, x is not evenly spaced, or dx is not above 0.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.calculus.trapezoid([1.0, 2.0, 4.0])
+    4.5
+    """
+    if x is not None and (np.ndim(x) == 1 and np.ptp(np.diff(as_array(x))) != 0):
+        weights = np.diff(as_array(x).astype(float))
+        return along(lambda channel: float(np.sum((channel[1:] + channel[:-1]) * weights) / 2), y, axis)
+    return integrate(y, x, dx, "trapezoid", axis)
+
+
+def simpson(y, x=None, dx=1.0, axis=LAST):
+    """The integral by Simpson's rule, exact for cubic polynomials, with any number of samples from 3 on.
+
+    Parameters
+    ----------
+    y : array_like
+        Samples.
+    x : array_like, optional
+        Where the samples are, evenly spaced.
+    dx : float
+        The distance between samples, where x is not given.
+    axis : int
+        The axis along which to work.
+
+    Returns
+    -------
+    float or ndarray
+
+    Raises
+    ------
+    ValueError
+        If there are too few samples for the rule, x is not evenly spaced, or dx is not above 0.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.calculus.simpson([0.0, 1.0, 4.0, 9.0])
+    9.0
+    """
+    return integrate(y, x, dx, "simpson", axis)
+
+
+def integrate(y, x=None, dx=1.0, rule="boole", axis=LAST):
+    """The integral by a composite rule of Newton and Cotes; what is left over of whole panels is taken
+    by a one-sided formula of the same order.
+
+    Parameters
+    ----------
+    y : array_like
+        Samples.
+    x : array_like, optional
+        Where the samples are, evenly spaced.
+    dx : float
+        The distance between samples, where x is not given.
+    rule : {"trapezoid", "simpson", "simpson38", "boole", "left", "right"}
+        Panels of 2, 3, 4 or 5 samples, or rectangles.
+    axis : int
+        The axis along which to work.
+
+    Returns
+    -------
+    float or ndarray
+
+    Raises
+    ------
+    ValueError
+        If there are too few samples for the rule, x is not evenly spaced, or dx is not above 0.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.calculus.integrate([0.0, 1.0, 16.0, 81.0, 256.0])
+    204.8
+    """
+    code = chosen("calculus.integrate", "rule", rule, RULES)
+    step = _step("calculus.integrate", x, dx)
+    return along(lambda channel: core.integrate(channel, step, code), y, axis)
+
+
+def integrate2(y, dx=1.0, dy=1.0, rule="simpson"):
+    """The integral over both dimensions of a matrix.
+
+    Parameters
+    ----------
+    y : array_like
+        Samples in two dimensions.
+    dx : float
+        The distance of samples in a row.
+    dy : float
+        The distance of rows.
+    rule : {"trapezoid", "simpson", "simpson38", "boole"}
+        As of `integrate`.
+
+    Returns
+    -------
+    float
+
+    Raises
+    ------
+    ValueError
+        If a dimension is below 3 or shorter than a panel, or rule is none of its words.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.calculus.integrate2([[1.0] * 3] * 3)
+    4.0
+    """
+    code = chosen("calculus.integrate2", "rule", rule, {name: RULES[name] for name in [*RULES][:4]})
+    return core.integrate2(as_array(y), [float(dx), float(dy)], code)
+
+
+def cumulative(y, x=None, dx=1.0, rule="corrected", axis=LAST):
+    """The running integral from 0 at the first sample.
+
+    Parameters
+    ----------
+    y : array_like
+        Samples.
+    x : array_like, optional
+        Where the samples are, evenly spaced.
+    dx : float
+        The distance between samples, where x is not given.
+    rule : {"corrected", "trapezoid", "simpson", "simpson38", "boole", "left", "right"}
+        "corrected" takes trapezoids and, by the formula of Euler and Maclaurin, the slopes at both ends:
+        an error of fourth order. Simpson's and the higher rules are exact for smooth samples, but noise
+        at half the sampling rate grows in them without bounds.
+    axis : int
+        The axis along which to work.
+
+    Returns
+    -------
+    ndarray, or what x is of pandas
+        Of the shape of y.
+
+    Raises
+    ------
+    ValueError
+        If there are too few samples for the rule, x is not evenly spaced, or dx is not above 0.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.calculus.cumulative([0.0, 1.0, 4.0, 9.0, 16.0]).round(9)
+    array([ 0.        ,  0.33333333,  2.66666667,  9.        , 21.33333333])
+    """
+    code = chosen("calculus.cumulative", "rule", rule, {"corrected": None, **RULES})
+    step = _step("calculus.cumulative", x, dx)
+    if code is not None:
+        return along(lambda channel: core.cumulative(channel, step, code), y, axis)
+    return along(lambda channel: _corrected(channel, step), y, axis)
+
+
+def _corrected(channel, step):
+    if len(channel) < 2:
+        return np.zeros(len(channel))
+    found = core.cumulative(channel, step, 0)
+    if len(channel) < 5:
+        return found
+    slopes = _slopes(channel, step, 1)
+    return found - (slopes - slopes[0]) * (step * step / 12)
+
+
+def _slopes(channel, step, code):
+    """The derivative, with samples beyond the ends from the polynomial through as many as the rule has."""
+    order = {0: 2, 1: 4, 2: 1, 3: 1}[code]
+    need = 2 if code == 1 else 1
+    if len(channel) <= order:
+        refuse("calculus.derivative", "y", f"at least {order + 1} samples are needed; {len(channel)} came",
+               "ErrSizesDisagree")
+    before, behind = list(channel[:order + 1]), list(channel[-order - 1:])
+    for _ in range(need):  # the next value of a polynomial has vanishing differences
+        signs = [(-1.0)**k * math.comb(order + 1, k) for k in range(1, order + 2)]
+        before.insert(0, -sum(s * v for s, v in zip(signs, before)))
+        behind.append(-sum(s * v for s, v in zip(signs, behind[::-1])))
+    return core.derivative(channel, before[:need], behind[-need:], step, code)
+
+
+def derivative(y, x=None, dx=1.0, rule="central", axis=LAST):
+    """The derivative of samples. Samples beyond the ends are those of the polynomial through the nearest
+    ones, so that the order of the rule holds up to the ends.
+
+    Parameters
+    ----------
+    y : array_like
+        Samples.
+    x : array_like, optional
+        Where the samples are, evenly spaced.
+    dx : float
+        The distance between samples, where x is not given.
+    rule : {"central", "five-point", "forward", "backward"}
+        Two or four samples around, the next one, the one before.
+    axis : int
+        The axis along which to work.
+
+    Returns
+    -------
+    ndarray, or what x is of pandas
+        Of the shape of y.
+
+    Raises
+    ------
+    ValueError
+        If there are too few samples for the rule, x is not evenly spaced, or dx is not above 0.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.calculus.derivative([0.0, 1.0, 4.0, 9.0])
+    array([0., 2., 4., 6.])
+    """
+    code = chosen("calculus.derivative", "rule", rule, DERIVATIVES)
+    step = _step("calculus.derivative", x, dx)
+    return along(lambda channel: _slopes(np.asarray(channel, float), step, code), y, axis)
+
+
+# The points and weights of Gauss and Kronrod with 7 and 15 points: A. S. Kronrod, "Nodes and weights of
+# quadrature formulas", 1965.
+_POINTS = np.array([0.991455371120812639206854697526329, 0.949107912342758524526189684047851,
+                    0.864864423359769072789712788640926, 0.741531185599394439863864773280788,
+                    0.586087235467691130294144691693390, 0.405845151377397166906606412076961,
+                    0.207784955007898467600689403773245, 0.0])
+_WEIGHTS = np.array([0.022935322010529224963732008058970, 0.063092092629978553290700663189204,
+                     0.104790010322250183839876322541518, 0.140653259715525918745189590510238,
+                     0.169004726639267902826583426598550, 0.190350578064785409913256402421014,
+                     0.204432940075298892414161999234649, 0.209482141084727828012999174891714])
+_GAUSS = np.array([0.129484966168869693270611432679082, 0.279705391489276667901467771423780,
+                   0.381830050505118944950369775488975, 0.417959183673469387755102040816327])
+_X15 = np.r_[-_POINTS, _POINTS[-2::-1]]
+_K15 = np.r_[_WEIGHTS, _WEIGHTS[-2::-1]]
+_G15 = np.zeros(15)
+_G15[1::2] = np.r_[_GAUSS, _GAUSS[-2::-1]]
+
+
+def quad(f, a, b, tolerance=1e-10, limit=1000):
+    r"""The integral of a function from a to b, by halving of the interval where the formulas of Gauss and
+    Kronrod disagree most.
+
+    .. math:: \int_a^b f(x)\,dx
+
+    Parameters
+    ----------
+    f : callable
+        Of an array of points; returns as many values, real or complex.
+    a, b : float
+        The ends; infinite ones are allowed.
+    tolerance : float
+        The error that is strived for, relative to the integral.
+    limit : int
+        The most intervals.
+
+    Returns
+    -------
+    Quadrature
+
+    Raises
+    ------
+    ValueError
+        If an end is NaN or limit is below 1.
+    QxError
+        If the function is not finite at a point.
+
+    Examples
+    --------
+    >>> import numpy as np, qx
+    >>> found = qx.calculus.quad(lambda x: np.exp(-x**2), -np.inf, np.inf)
+    >>> round(found.value**2, 9)
+    3.141592654
+    """
+    if math.isnan(a) or math.isnan(b):
+        refuse("calculus.quad", "a, b", "an end is NaN", "ErrNaNInData")
+    limit = whole_number("calculus.quad", "limit", limit, 1)
+    if math.isinf(a) or math.isinf(b):
+        return _quad_infinite(f, a, b, tolerance, limit)
+
+    def part(low, high):
+        half, middle = (high - low) / 2, (high + low) / 2
+        values = np.asarray(f(middle + half * _X15))
+        whole = half * np.sum(_K15 * values)
+        return abs(whole - half * np.sum(_G15 * values)), whole, low, high
+
+    parts = [part(float(a), float(b))]
+    while len(parts) < limit:
+        error, total = sum(one[0] for one in parts), sum(one[1] for one in parts)
+        worst = max(range(len(parts)), key=lambda i: parts[i][0])
+        _, _, low, high = parts[worst]
+        middle = (low + high) / 2
+        if not error > tolerance * abs(total) or not low < middle < high and not high < middle < low:
+            break
+        parts[worst:worst + 1] = [part(low, middle), part(middle, high)]
+    value, error = sum(one[1] for one in parts), sum(one[0] for one in parts)
+    if not np.isfinite(value):
+        refuse("calculus.quad", "f", "is not finite at a point", "ErrNonFiniteFunction")
+    return Quadrature(value[()], float(error), 15 * (2 * len(parts) - 1))
+
+
+def _quad_infinite(f, a, b, tolerance, limit):
+    """By x = t / (1 - t^2), which takes -1 to 1 to all numbers."""
+    def place(x):
+        if math.isinf(x):
+            return math.copysign(1.0, x)
+        return 2 * x / (1 + math.sqrt(1 + 4 * x * x))
+
+    def changed(t):
+        rest = 1 - t * t
+        return np.asarray(f(t / rest)) * ((1 + t * t) / (rest * rest))
+
+    return quad(changed, place(a), place(b), tolerance, limit)
+
+
+def velocity(acceleration, fs, drift=1, cutoff=None, axis=LAST):
+    """The velocity of a measured acceleration. What an offset of the acceleration and the unknown
+    velocity at the beginning make of it, a line, is removed.
+
+    Parameters
+    ----------
+    acceleration : array_like
+        In units of length by time squared.
+    fs : float
+        The sampling rate.
+    drift : int or None
+        The order of the polynomial that is removed from the result; None for nothing.
+    cutoff : float, optional
+        A frequency, in the unit of fs, below which there is only drift: a Butterworth highpass of second
+        order in both directions removes it.
+    axis : int
+        The axis of time.
+
+    Returns
+    -------
+    ndarray, or what acceleration is of pandas
+        Of the shape of acceleration.
+
+    Raises
+    ------
+    ValueError
+        If fs is not above 0, or there are too few samples.
+
+    Examples
+    --------
+    >>> import numpy as np, qx
+    >>> t = np.arange(2000) / 1000
+    >>> a = np.cos(2 * np.pi * 5 * t) + 0.3
+    >>> found = qx.calculus.velocity(a, 1000)
+    >>> round(float(np.ptp(found)) * np.pi * 5, 2)
+    1.08
+    """
+    return _motion(acceleration, fs, drift, cutoff, 1, axis)
+
+
+def _motion(acceleration, fs, drift, cutoff, times, axis):
+    from . import filters, signals
+    if not fs > 0:
+        refuse("calculus.velocity", "fs", f"must be above 0; {fs} came", "ErrSamplingNotPositive")
+    found = acceleration
+    for _ in range(times):
+        found = cumulative(found, dx=1 / fs, axis=axis)
+    if drift is not None:
+        found = signals.detrend(found, drift, axis)
+    if cutoff is not None:
+        found = filters.butterworth(2, cutoff, "highpass", fs).zero_phase(found, axis)
+    return found
+
+
+def displacement(acceleration, fs, drift=2, cutoff=None, axis=LAST):
+    """The displacement of a measured acceleration. What an offset of the acceleration, and velocity and
+    place at the beginning make of it, a parabola, is removed.
+
+    Parameters
+    ----------
+    acceleration : array_like
+        In units of length by time squared.
+    fs : float
+        The sampling rate.
+    drift : int or None
+        The order of the polynomial that is removed from the result; None for nothing.
+    cutoff : float, optional
+        As of `velocity`.
+    axis : int
+        The axis of time.
+
+    Returns
+    -------
+    ndarray, or what acceleration is of pandas
+        Of the shape of acceleration.
+
+    Raises
+    ------
+    ValueError
+        If fs is not above 0, or there are too few samples.
+
+    Examples
+    --------
+    >>> import numpy as np, qx
+    >>> t = np.arange(2000) / 1000
+    >>> a = -(2 * np.pi * 5)**2 * np.sin(2 * np.pi * 5 * t) + 0.3
+    >>> found = qx.calculus.displacement(a, 1000)
+    >>> round(float(np.ptp(found)), 1)
+    2.2
+    """
+    return _motion(acceleration, fs, drift, cutoff, 2, axis)

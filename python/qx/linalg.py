@@ -1,0 +1,1439 @@
+"""Linear algebra: systems, least squares, eigenvalues, decompositions, functions of matrices and matrix
+equations.
+
+Names and arguments are those of `numpy.linalg` and `scipy.linalg`. Matrices may be real or complex, and
+may be stacked: what has more than two dimensions is taken matrix by matrix, in threads. A singular matrix
+is a `numpy.linalg.LinAlgError`; a system that leaves few digits is a warning.
+"""
+
+import math
+
+import numpy as np
+
+from .outcomes import QxWarning, keeping, warn
+from .topical import Result, chosen, refuse, result, served, whole_number
+from .topical.axes import as_array, many
+
+__all__ = ["Eigen", "Hessenberg", "LU", "LeastSquares", "QR", "QZ", "SVD", "Schur", "charpoly",
+           "cholesky", "companion", "cond", "det", "eig", "eigh", "eigvals", "eigvalsh",
+           "expm", "hessenberg", "inv", "is_positive_definite", "kron", "logm", "lstsq", "lu",
+           "matrix_power", "matrix_rank", "norm", "pinv", "qr", "qz", "schur", "solve",
+           "solve_banded", "solve_discrete_lyapunov", "solve_lyapunov", "solve_sylvester",
+           "sqrtm", "svd", "svdvals", "toeplitz", "trace"]
+
+core = served("linalg")
+
+EPS = np.finfo(float).eps
+WORST = 1e-4 / EPS  # the condition from which on fewer than four digits are certain
+SMALL = 48  # the order up to which an inverse costs less than an estimate of its norm
+
+
+@result
+class LeastSquares(Result):
+    """A least-squares solution; unpacked as that of `numpy.linalg.lstsq`.
+
+    Attributes
+    ----------
+    x : ndarray
+        The solution, of smallest norm where there are several.
+    residuals : ndarray
+        The sums of the squared residuals, one for each right side.
+    rank : int
+        The rank of the matrix.
+    singular_values : ndarray
+        Of the matrix, falling.
+    """
+
+    x: np.ndarray
+    residuals: np.ndarray
+    rank: int
+    singular_values: np.ndarray
+
+
+@result
+class Eigen(Result):
+    """Eigenvalues and eigenvectors: a v = v diag(values).
+
+    Attributes
+    ----------
+    values : ndarray
+        The eigenvalues.
+    vectors : ndarray
+        The eigenvectors in the columns.
+    """
+
+    values: np.ndarray
+    vectors: np.ndarray
+
+
+@result
+class SVD(Result):
+    """A singular value decomposition: a = u diag(s) vh.
+
+    Attributes
+    ----------
+    u : ndarray
+        The left singular vectors in the columns.
+    s : ndarray
+        The singular values, falling.
+    vh : ndarray
+        The right singular vectors, conjugated, in the rows.
+    """
+
+    u: np.ndarray
+    s: np.ndarray
+    vh: np.ndarray
+
+
+@result
+class QR(Result):
+    """A QR decomposition: a = q r, or a[:, permutation] = q r.
+
+    Attributes
+    ----------
+    q : ndarray
+        Orthonormal columns.
+    r : ndarray
+        An upper triangle.
+    permutation : ndarray or None
+        The order of the columns where they were exchanged.
+    """
+
+    q: np.ndarray
+    r: np.ndarray
+    permutation: "np.ndarray | None" = None
+
+    def __iter__(self):
+        return iter((self.q, self.r) if self.permutation is None else (self.q, self.r, self.permutation))
+
+
+@result
+class LU(Result):
+    """An LU decomposition: a = p l u.
+
+    Attributes
+    ----------
+    p : ndarray
+        A permutation.
+    l : ndarray
+        A lower triangle with ones on the diagonal.
+    u : ndarray
+        An upper triangle.
+    """
+
+    p: np.ndarray
+    l: np.ndarray  # noqa: E741
+    u: np.ndarray
+
+
+@result
+class Schur(Result):
+    """A Schur form: a = z t z^H; real ones have blocks of two for conjugate eigenvalues.
+
+    Attributes
+    ----------
+    t : ndarray
+        The (almost) triangular form.
+    z : ndarray
+        Unitary.
+    values : ndarray
+        The eigenvalues in the order of the diagonal.
+    """
+
+    t: np.ndarray
+    z: np.ndarray
+    values: np.ndarray
+    _unpacked = ("t", "z")
+
+
+@result
+class QZ(Result):
+    """A generalised Schur form: a = q s z^H, b = q t z^H.
+
+    Attributes
+    ----------
+    s, t : ndarray
+        The (almost) triangular forms.
+    q, z : ndarray
+        Unitary.
+    alpha, beta : ndarray
+        The eigenvalues are alpha / beta.
+    """
+
+    s: np.ndarray
+    t: np.ndarray
+    q: np.ndarray
+    z: np.ndarray
+    alpha: np.ndarray
+    beta: np.ndarray
+    _unpacked = ("s", "t", "q", "z")
+
+
+@result
+class Hessenberg(Result):
+    """A Hessenberg form: a = q h q^H.
+
+    Attributes
+    ----------
+    h : ndarray
+        Zero below the first subdiagonal.
+    q : ndarray
+        Unitary.
+    """
+
+    h: np.ndarray
+    q: np.ndarray
+
+
+def _served(name, *matrices):
+    """The export for real or for complex matrices."""
+    is_complex = any(matrix.dtype.kind == "c" for matrix in matrices)
+    return getattr(core, name + "_complex" if is_complex else name)
+
+
+def _matrix(function, a, is_square=False, argument="a"):
+    a = as_array(a)
+    if a.ndim < 2:
+        refuse(function, argument, f"at least two dimensions are needed; {a.ndim} came", "ErrNotSquare")
+    if is_square and a.shape[-1] != a.shape[-2]:
+        refuse(function, argument, f"must be square; {a.shape[-2]} by {a.shape[-1]} came", "ErrNotSquare")
+    if not a.size:
+        refuse(function, argument, "is empty", "ErrEmptyInput")
+    return a
+
+
+def _each(function, *stacks):
+    """The function of matrices over the stacks of them."""
+    if all(stack.ndim == 2 for stack in stacks):
+        return function(*stacks)
+    shape = np.broadcast_shapes(*(stack.shape[:-2] for stack in stacks))
+    flat = [np.broadcast_to(stack, shape + stack.shape[-2:]).reshape(-1, *stack.shape[-2:]) for stack in stacks]
+    rows = [*zip(*flat)]
+    found = many(lambda row: function(*row), rows, sum(one.size for one in flat))
+
+    def stacked(parts):
+        parts = [np.asarray(part) for part in parts]
+        return np.stack(parts).reshape(*shape, *parts[0].shape)
+
+    if isinstance(found[0], Result):
+        return type(found[0])(*(None if parts[0] is None else stacked(parts) for parts in zip(
+            *((getattr(one, name) for name in one.__dataclass_fields__) for one in found))))
+    return stacked(found)
+
+
+def _near_one(a):
+    """The matrix by the power of two next to its largest element, and that power. What stands on singular
+    values loses digits for matrices of a norm far below 1."""
+    largest = np.abs(a).max(initial=0)
+    if not 0 < largest < np.inf:
+        return a, 1.0
+    power = 2.0 ** math.frexp(largest)[1]
+    return (a, 1.0) if not 0 < power < np.inf else (a / power, power)
+
+
+def _sides(function, a, b):
+    """b as a matrix, and whether it was a vector."""
+    b = as_array(b)
+    is_vector = b.ndim == 1 or b.ndim == a.ndim - 1 and b.ndim > 1 and b.shape == a.shape[:-1]
+    columns = b[..., None] if is_vector else b
+    if columns.ndim < 2 or columns.shape[-2] != a.shape[-2]:
+        refuse(function, "b", f"must have as many rows as a, {a.shape[-2]}; shape {b.shape} came",
+               "ErrSizeMismatch")
+    return columns, is_vector
+
+
+def _factors(function, a):
+    """The LU factors and pivots of a matrix that is not singular."""
+    (lu, pivots, _), kept = keeping(_served("lu", a), a)
+    if kept or not np.all(np.diagonal(lu)):
+        refuse(function, "a", "is singular: a pivot is 0", "ErrSingularMatrix")
+    return lu, pivots
+
+
+def _solved(lu, pivots, columns):
+    solve_one = _served("solve", lu, columns)
+    return np.stack([solve_one(lu, pivots, column) for column in columns.T], -1)
+
+
+def _inverse_norm(lu, pivots):
+    """The largest column sum of moduli of the inverse: exact for small matrices, else an estimate from
+    below (W. W. Hager, "Condition estimates", 1984)."""
+    n = len(lu)
+    if n <= SMALL:
+        return np.abs(_served("solve_inverse", lu)(lu, pivots)).sum(0).max()
+    lower, upper = np.tril(lu, -1) + np.eye(n), np.triu(lu)
+    order = np.arange(n)
+    for step, pivot in enumerate(pivots):
+        order[[step, pivot]] = order[[pivot, step]]
+
+    def transposed(v):
+        y = np.conj(_served("solve_triangular", lu)(np.ascontiguousarray(upper.T), 0, np.conj(v)[:, None]))
+        y = np.conj(_served("solve_triangular", lu)(np.ascontiguousarray(lower.T), 1, np.conj(y)))[:, 0]
+        found = np.empty_like(y)
+        found[order] = y
+        return found
+
+    x, best = np.full(n, 1 / n), 0.0
+    for _ in range(5):
+        y = _solved(lu, pivots, x[:, None].astype(lu.dtype))[:, 0]
+        best = max(best, np.abs(y).sum())
+        z = transposed(np.where(y == 0, 1, y / np.where(y == 0, 1, np.abs(y))).astype(lu.dtype))
+        at = int(np.argmax(np.abs(z)))
+        if np.abs(z[at]) <= abs(np.vdot(z, x)):
+            break
+        x = np.zeros(n)
+        x[at] = 1
+    return best
+
+
+def _warn_of(function, condition):
+    if not condition < WORST:
+        digits = max(0, math.floor(-math.log10(EPS * condition))) if condition < np.inf else 0
+        warn(QxWarning(f"qx.{function}", 20006, f"qx.{function}: a is badly conditioned, {condition:.1e}: of the "
+                       f"result about {digits} digits are certain"))
+
+
+def _condition(a, lu, pivots):
+    try:
+        return float(np.abs(a).sum(0).max() * _inverse_norm(lu, pivots))
+    except np.linalg.LinAlgError:
+        return np.inf  # what the estimate solves is singular to rounding
+
+
+ASSUMPTIONS = {"general": "general", "positive": "positive", "lower": "lower", "upper": "upper"}
+
+
+def solve(a, b, assume="general"):
+    """The solution x of a x = b.
+
+    By LU factorisation with row exchanges. Where the condition number leaves fewer than four digits, a
+    `QxWarning` says so.
+
+    Parameters
+    ----------
+    a : array_like
+        A square matrix, or a stack of them.
+    b : array_like
+        A vector, or a matrix with a right side in each column.
+    assume : {"general", "positive", "lower", "upper"}
+        What a is: anything, symmetric (Hermitian) and positive definite, or a triangle; the other
+        triangle is not read then.
+
+    Returns
+    -------
+    ndarray
+        Of the shape of b.
+
+    Raises
+    ------
+    numpy.linalg.LinAlgError
+        If a is not square, singular, or not positive definite.
+    ValueError
+        If b does not fit a, or assume is none of its words.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.linalg.solve([[2.0, 1.0], [1.0, 3.0]], [3.0, 5.0]).round(12)
+    array([0.8, 1.4])
+    """
+    kind = chosen("linalg.solve", "assume", assume, ASSUMPTIONS)
+    a = _matrix("linalg.solve", a, True)
+    columns, is_vector = _sides("linalg.solve", a, b)
+
+    def of_one(a, columns):
+        if kind in ("lower", "upper"):
+            return _served("solve_triangular", a, columns)(a, int(kind == "upper"), columns)
+        if kind == "positive":
+            return _served("solve_positive", a, columns)(a, 0, columns)
+        lu, pivots = _factors("linalg.solve", a)
+        _warn_of("linalg.solve", _condition(a, lu, pivots))
+        if columns.dtype.kind == "c" and lu.dtype.kind != "c":
+            lu = lu.astype(complex)
+        return _solved(lu, pivots, columns)
+
+    found = _each(of_one, a, columns)
+    return found[..., 0] if is_vector else found
+
+
+def lstsq(a, b, rcond=None):
+    """The x with the least sum of squares of a x - b, the smallest of them where there are several; by
+    singular values.
+
+    Parameters
+    ----------
+    a : array_like
+        A matrix, real or complex.
+    b : array_like
+        A vector, or a matrix with a right side in each column.
+    rcond : float, optional
+        Singular values up to so many times the largest one count as 0; max(m, n) eps by default.
+
+    Returns
+    -------
+    LeastSquares
+
+    Raises
+    ------
+    ValueError
+        If b does not fit a, or an element is not finite.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.linalg.lstsq([[1.0, 0.0], [1.0, 1.0], [1.0, 2.0]], [1.0, 2.0, 2.0]).x.round(6)
+    array([1.166667, 0.5     ])
+    """
+    a = _matrix("linalg.lstsq", a)
+    if a.ndim > 2:
+        refuse("linalg.lstsq", "a", "one matrix is needed, not a stack", "ErrSizesDisagree")
+    columns, is_vector = _sides("linalg.lstsq", a, b)
+    scaled, power = _near_one(a)
+    limit = max(a.shape) * EPS if rcond is None else float(rcond)
+    x = _served("lstsq", a, columns)(scaled, columns, limit / max(a.shape)) / power
+    values = _served("svdvals", a)(scaled) * power
+    rank = int(np.sum(values > limit * values.max(initial=0)))
+    left = np.sum(np.abs(columns - a @ x)**2, 0)
+    return LeastSquares(x[:, 0] if is_vector else x, left, rank, values)
+
+
+def inv(a):
+    """The inverse of a square matrix, by LU factorisation.
+
+    Parameters
+    ----------
+    a : array_like
+        A square matrix, real or complex.
+
+    Returns
+    -------
+    ndarray
+
+    Raises
+    ------
+    numpy.linalg.LinAlgError
+        If a is not square or singular.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.linalg.inv([[2.0, 1.0], [1.0, 1.0]])
+    array([[ 1., -1.],
+           [-1.,  2.]])
+    """
+    a = _matrix("linalg.inv", a, True)
+
+    def of_one(a):
+        lu, pivots = _factors("linalg.inv", a)
+        found = _served("solve_inverse", a)(lu, pivots)
+        _warn_of("linalg.inv", np.abs(a).sum(0).max() * np.abs(found).sum(0).max())
+        return found
+
+    return _each(of_one, a)
+
+
+def pinv(a, rcond=None):
+    """The pseudo-inverse (E. H. Moore, R. Penrose), by singular values.
+
+    Parameters
+    ----------
+    a : array_like
+        A matrix, real or complex.
+    rcond : float, optional
+        Singular values up to so many times the largest one count as 0; max(m, n) eps by default.
+
+    Returns
+    -------
+    ndarray
+
+    Raises
+    ------
+    ValueError
+        If a is empty or has an element that is not finite.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.linalg.pinv([[1.0], [1.0]]).round(12)
+    array([[0.5, 0.5]])
+    """
+    def of_one(a):
+        scaled, power = _near_one(a)
+        largest = _served("svdvals", a)(scaled).max()
+        limit = (max(a.shape) * EPS if rcond is None else rcond) * largest
+        return _served("pinv", a)(scaled, float(limit)) / power
+
+    return _each(of_one, _matrix("linalg.pinv", a))
+
+
+def det(a):
+    """The determinant of a square matrix.
+
+    Parameters
+    ----------
+    a : array_like
+        A square matrix, real or complex.
+
+    Returns
+    -------
+    float or complex
+
+    Raises
+    ------
+    numpy.linalg.LinAlgError
+        If a is not square.
+    ValueError
+        If a is empty or has an element that is not finite.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.linalg.det([[2.0, 1.0], [1.0, 3.0]])
+    5.0
+    """
+    return _each(lambda a: _served("det", a)(a, 0), _matrix("linalg.det", a, True))
+
+
+def trace(a):
+    """The sum of the diagonal of a square matrix.
+
+    Parameters
+    ----------
+    a : array_like
+        A square matrix, real or complex.
+
+    Returns
+    -------
+    float or complex
+
+    Raises
+    ------
+    numpy.linalg.LinAlgError
+        If a is not square.
+    ValueError
+        If a is empty or has an element that is not finite.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.linalg.trace([[2.0, 1.0], [1.0, 3.0]])
+    5.0
+    """
+    return _each(lambda a: _served("trace", a)(a), _matrix("linalg.trace", a, True))
+
+
+NORMS = {"spectral": 0, 2: 0, 1: 1, "fro": 2, "frobenius": 2, math.inf: 3}
+CONDITIONS = {None: 0, 2: 0, 1: 1, "fro": 2, "frobenius": 2, math.inf: 3}
+
+
+def norm(a, ord=None):
+    """The norm of a vector or a matrix.
+
+    Parameters
+    ----------
+    a : array_like
+        One or two dimensions.
+    ord : int, float or str, optional
+        Of a vector the p of its p-norm, 2 by default. Of a matrix 2 or "spectral", the largest singular
+        value; 1 or inf, the largest sum of a column or a row; "fro", the root of the sum of squares,
+        which is the default.
+
+    Returns
+    -------
+    float
+
+    Raises
+    ------
+    ValueError
+        If a is empty, or ord is none of its words.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.linalg.norm([[3.0, 0.0], [4.0, 0.0]]), qx.linalg.norm([1.0, -2.0], 1)
+    (5.0, 3.0)
+    """
+    a = as_array(a)
+    if a.ndim == 1:
+        return _served("norm_vector", a)(a, 2.0 if ord is None else float(ord))
+    kind = chosen("linalg.norm", "ord", "fro" if ord is None else ord, NORMS)
+    scaled, power = _near_one(_matrix("linalg.norm", a)) if kind == 0 else (_matrix("linalg.norm", a), 1.0)
+    if a.ndim > 2:
+        refuse("linalg.norm", "a", "one matrix is needed, not a stack", "ErrSizesDisagree")
+    return _served("norm", a)(scaled, kind) * power
+
+
+def cond(a, p=None):
+    """The condition number: by how much relative errors of the right side of a system may grow.
+
+    Parameters
+    ----------
+    a : array_like
+        A matrix, real or complex.
+    p : {None, 2, 1, inf, "fro"}
+        The norm; by default 2, the ratio of the singular values.
+
+    Returns
+    -------
+    float
+
+    Raises
+    ------
+    ValueError
+        If a is empty, or p is none of its words.
+    numpy.linalg.LinAlgError
+        If a is not square, for other norms than 2.
+
+    Examples
+    --------
+    >>> import qx
+    >>> round(qx.linalg.cond([[2.0, 0.0], [0.0, 0.5]]), 12)
+    4.0
+    """
+    kind = chosen("linalg.cond", "p", p, CONDITIONS)
+    return _each(lambda a: _served("cond", a)(_near_one(a)[0], kind), _matrix("linalg.cond", a, kind > 0))
+
+
+def matrix_rank(a, rcond=None):
+    """The number of singular values above rcond times the largest one.
+
+    Parameters
+    ----------
+    a : array_like
+        A matrix, real or complex.
+    rcond : float, optional
+        max(m, n) eps by default.
+
+    Returns
+    -------
+    int
+
+    Raises
+    ------
+    ValueError
+        If a is empty or has an element that is not finite.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.linalg.matrix_rank([[1.0, 2.0], [2.0, 4.0]])
+    1
+    """
+    def of_one(a):
+        scaled, _ = _near_one(a)
+        limit = (max(a.shape) * EPS if rcond is None else rcond) * _served("svdvals", a)(scaled).max()
+        return _served("matrix_rank", a)(scaled, float(limit))
+
+    return _each(of_one, _matrix("linalg.matrix_rank", a))
+
+
+def eig(a, b=None):
+    """Eigenvalues and eigenvectors of unit length of a square matrix; with b those of a v = value b v.
+
+    Parameters
+    ----------
+    a : array_like
+        A square matrix, real or complex.
+    b : array_like, optional
+        A second matrix of the same shape.
+
+    Returns
+    -------
+    Eigen
+
+    Raises
+    ------
+    numpy.linalg.LinAlgError
+        If a is not square.
+    ValueError
+        If a is empty or has an element that is not finite.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.linalg.eig([[0.0, 1.0], [-1.0, 0.0]]).values
+    array([0.+1.j, 0.-1.j])
+    """
+    a = _matrix("linalg.eig", a, True)
+    if b is None:
+        return _each(lambda a: Eigen(*(core.eig_complex(a, 0, 1) if a.dtype.kind == "c" else core.eig(a, 1))), a)
+    b = _matrix("linalg.eig", b, True, "b")
+    return _each(lambda a, b: Eigen(*_served("eig_general", a, b)(a, b, 1)), a, b)
+
+
+def eigvals(a, b=None):
+    """The eigenvalues of `eig`, without the vectors.
+
+    Parameters
+    ----------
+    a : array_like
+        A square matrix, real or complex.
+    b : array_like, optional
+        A second matrix of the same shape.
+
+    Returns
+    -------
+    ndarray of complex128
+
+    Raises
+    ------
+    numpy.linalg.LinAlgError
+        If a is not square.
+    ValueError
+        If a is empty or has an element that is not finite.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.linalg.eigvals([[2.0, 0.0], [0.0, 1.0]]).real
+    array([2., 1.])
+    """
+    a = _matrix("linalg.eigvals", a, True)
+    if b is None:
+        return _each(lambda a: (core.eig_complex(a, 0, 0) if a.dtype.kind == "c" else core.eig(a, 0))[0], a)
+    b = _matrix("linalg.eigvals", b, True, "b")
+    return _each(lambda a, b: _served("eig_general", a, b)(a, b, 0)[0], a, b)
+
+
+def eigh(a):
+    """Eigenvalues, ascending, and orthonormal eigenvectors of a symmetric or Hermitian matrix, read from
+    its lower triangle.
+
+    Parameters
+    ----------
+    a : array_like
+        A square matrix, real or complex.
+
+    Returns
+    -------
+    Eigen
+
+    Raises
+    ------
+    numpy.linalg.LinAlgError
+        If a is not square.
+    ValueError
+        If a is empty or has an element that is not finite.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.linalg.eigh([[2.0, 1.0], [1.0, 2.0]]).values.round(12)
+    array([1., 3.])
+    """
+    def of_one(a):
+        if a.dtype.kind == "c":
+            values, vectors = core.eig_complex(a, 1, 1)
+            return Eigen(values.real, vectors)
+        vectors, values = core.eigh(a, 1)
+        return Eigen(values, vectors)
+
+    return _each(of_one, _matrix("linalg.eigh", a, True))
+
+
+def eigvalsh(a):
+    """The eigenvalues of `eigh`, without the vectors.
+
+    Parameters
+    ----------
+    a : array_like
+        A square matrix, real or complex.
+
+    Returns
+    -------
+    ndarray of float64
+
+    Raises
+    ------
+    numpy.linalg.LinAlgError
+        If a is not square.
+    ValueError
+        If a is empty or has an element that is not finite.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.linalg.eigvalsh([[2.0, 1.0], [1.0, 2.0]]).round(12)
+    array([1., 3.])
+    """
+    return _each(lambda a: core.eig_complex(a, 1, 0)[0].real if a.dtype.kind == "c" else core.eigh(a, 0)[1],
+                 _matrix("linalg.eigvalsh", a, True))
+
+
+def svd(a, full_matrices=True):
+    r"""The singular value decomposition.
+
+    .. math:: a = u\, \mathrm{diag}(s)\, v^H
+
+    Parameters
+    ----------
+    a : array_like
+        A matrix, real or complex.
+    full_matrices : bool
+        Square u and vh, in place of as many vectors as there are values.
+
+    Returns
+    -------
+    SVD
+
+    Raises
+    ------
+    ValueError
+        If a is empty or has an element that is not finite.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.linalg.svd([[3.0, 0.0], [0.0, 4.0]]).s.round(12)
+    array([4., 3.])
+    """
+    def of_one(a):
+        scaled, power = _near_one(a)
+        u, s, v = _served("svd", a)(scaled, int(full_matrices))
+        return SVD(u, s * power, v.conj().T)
+
+    return _each(of_one, _matrix("linalg.svd", a))
+
+
+def svdvals(a):
+    """The singular values, falling.
+
+    Parameters
+    ----------
+    a : array_like
+        A matrix, real or complex.
+
+    Returns
+    -------
+    ndarray of float64
+
+    Raises
+    ------
+    ValueError
+        If a is empty or has an element that is not finite.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.linalg.svdvals([[3.0, 0.0], [0.0, 4.0]]).round(12)
+    array([4., 3.])
+    """
+    def of_one(a):
+        scaled, power = _near_one(a)
+        return _served("svdvals", a)(scaled) * power
+
+    return _each(of_one, _matrix("linalg.svdvals", a))
+
+
+def qr(a, mode="reduced", pivoting=False):
+    """The QR decomposition by Householder reflections.
+
+    Parameters
+    ----------
+    a : array_like
+        A matrix, real or complex.
+    mode : {"reduced", "complete"}
+        q with min(m, n) columns, or square.
+    pivoting : bool
+        Exchange columns so that the diagonal of r falls.
+
+    Returns
+    -------
+    QR
+
+    Raises
+    ------
+    ValueError
+        If a is empty, has an element that is not finite, or mode is none of its words.
+
+    Examples
+    --------
+    >>> import qx
+    >>> q, r = qx.linalg.qr([[3.0, 1.0], [4.0, 2.0]])
+    >>> abs(r).round(12)
+    array([[5. , 2.2],
+           [0. , 0.4]])
+    """
+    economy = chosen("linalg.qr", "mode", mode, {"reduced": 1, "complete": 0})
+
+    def of_one(a):
+        permutation, q, r = _served("qr", a)(a, int(pivoting), economy)
+        return QR(q, r, np.argmax(np.abs(permutation), 0) if pivoting else None)
+
+    return _each(of_one, _matrix("linalg.qr", a))
+
+
+def lu(a):
+    """The LU decomposition with row exchanges, a = p l u; also of a singular matrix.
+
+    Parameters
+    ----------
+    a : array_like
+        A matrix, real or complex.
+
+    Returns
+    -------
+    LU
+
+    Raises
+    ------
+    ValueError
+        If a is empty.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.linalg.lu([[1.0, 2.0], [3.0, 4.0]]).u.round(6)
+    array([[3.      , 4.      ],
+           [0.      , 0.666667]])
+    """
+    def of_one(a):
+        (packed, pivots, _), _ = keeping(_served("lu", a), a)
+        m, n = a.shape
+        k, order = min(m, n), np.arange(m)
+        for step, pivot in enumerate(pivots[:m]):
+            order[[step, pivot]] = order[[pivot, step]]
+        p = np.zeros((m, m))
+        p[order, np.arange(m)] = 1
+        return LU(p, np.tril(packed[:, :k], -1) + np.eye(m, k), np.triu(packed[:k]))
+
+    return _each(of_one, _matrix("linalg.lu", a))
+
+
+def cholesky(a):
+    """The lower triangle l with a = l l^H, of a symmetric (Hermitian) and positive definite matrix read
+    from its lower triangle.
+
+    Parameters
+    ----------
+    a : array_like
+        A square matrix, real or complex.
+
+    Returns
+    -------
+    ndarray
+
+    Raises
+    ------
+    numpy.linalg.LinAlgError
+        If a is not square, not positive definite, or nearly singular.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.linalg.cholesky([[4.0, 2.0], [2.0, 2.0]])
+    array([[2., 0.],
+           [1., 1.]])
+    """
+    return _each(lambda a: _served("cholesky", a)(a), _matrix("linalg.cholesky", a, True))
+
+
+SORTS = {"none": 0, "ascending real": 1, "descending real": 2, "ascending": 3, "descending": 4}
+
+
+def schur(a, sort="none"):
+    """The Schur form of a square matrix.
+
+    Parameters
+    ----------
+    a : array_like
+        A square matrix, real or complex.
+    sort : {"none", "ascending real", "descending real", "ascending", "descending"}
+        The order of the eigenvalues: as they come, by their real parts, or by their moduli.
+
+    Returns
+    -------
+    Schur
+
+    Raises
+    ------
+    numpy.linalg.LinAlgError
+        If a is not square.
+    ValueError
+        If a is empty or has an element that is not finite.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.linalg.schur([[1.0, 2.0], [0.0, 3.0]], "descending").values.real.round(12)
+    array([3., 1.])
+    """
+    order = chosen("linalg.schur", "sort", sort, SORTS)
+
+    def of_one(a):
+        t, z, values = _served("schur", a)(a, 1, order)
+        return Schur(t, z, values)
+
+    return _each(of_one, _matrix("linalg.schur", a, True))
+
+
+def qz(a, b, sort="none"):
+    """The generalised Schur form of two square matrices.
+
+    Parameters
+    ----------
+    a, b : array_like
+        Square matrices of one shape.
+    sort : {"none", "ascending real", "descending real", "ascending", "descending"}
+        As of `schur`.
+
+    Returns
+    -------
+    QZ
+
+    Raises
+    ------
+    numpy.linalg.LinAlgError
+        If a or b is not square.
+    ValueError
+        If they differ in shape, or sort is none of its words.
+
+    Examples
+    --------
+    >>> import qx
+    >>> found = qx.linalg.qz([[2.0, 0.0], [0.0, 3.0]], [[1.0, 0.0], [0.0, 1.0]])
+    >>> (found.alpha / found.beta).real.round(12)
+    array([2., 3.])
+    """
+    order = chosen("linalg.qz", "sort", sort, SORTS)
+
+    def of_one(a, b):
+        s, t, q, z, alpha, beta = _served("qz", a, b)(a, b, 1, order)
+        return QZ(s, t, q, z, alpha, beta)
+
+    return _each(of_one, _matrix("linalg.qz", a, True), _matrix("linalg.qz", b, True, "b"))
+
+
+def hessenberg(a):
+    """The Hessenberg form of a square matrix.
+
+    Parameters
+    ----------
+    a : array_like
+        A square matrix, real or complex.
+
+    Returns
+    -------
+    Hessenberg
+
+    Raises
+    ------
+    numpy.linalg.LinAlgError
+        If a is not square.
+    ValueError
+        If a is empty or has an element that is not finite.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.linalg.hessenberg([[1.0, 2.0], [3.0, 4.0]]).h
+    array([[1., 2.],
+           [3., 4.]])
+    """
+    return _each(lambda a: Hessenberg(*_served("hessenberg", a)(a, 1, len(a))), _matrix("linalg.hessenberg", a, True))
+
+
+def expm(a):
+    r"""The exponential of a square matrix.
+
+    .. math:: e^A = \sum_k A^k / k!
+
+    Parameters
+    ----------
+    a : array_like
+        A square matrix, real or complex.
+
+    Returns
+    -------
+    ndarray
+
+    Raises
+    ------
+    numpy.linalg.LinAlgError
+        If a is not square.
+    ValueError
+        If a is empty or has an element that is not finite.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.linalg.expm([[0.0, 1.0], [0.0, 0.0]])
+    array([[1., 1.],
+           [0., 1.]])
+    """
+    return _each(lambda a: _served("expm", a)(a), _matrix("linalg.expm", a, True))
+
+
+def logm(a):
+    """The principal logarithm of a square matrix.
+
+    Parameters
+    ----------
+    a : array_like
+        A square matrix, real or complex.
+
+    Returns
+    -------
+    ndarray
+        Complex where eigenvalues are negative or complex.
+
+    Raises
+    ------
+    numpy.linalg.LinAlgError
+        If a is not square, or its eigenvectors are dependent.
+    ValueError
+        If a has the eigenvalue 0, or an element that is not finite.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.linalg.logm([[1.0, 1.0], [0.0, 1.0]]).real.round(9) + 0.0
+    array([[0., 1.],
+           [0., 0.]])
+    """
+    def of_one(a):
+        found = _served("logm", a)(a)
+        return found.real if found.dtype.kind == "c" and a.dtype.kind != "c" and not np.any(found.imag) else found
+
+    return _each(of_one, _matrix("linalg.logm", a, True))
+
+
+def sqrtm(a):
+    """The principal square root of a square matrix.
+
+    Parameters
+    ----------
+    a : array_like
+        A square matrix, real or complex.
+
+    Returns
+    -------
+    ndarray
+        Complex where eigenvalues are negative.
+
+    Raises
+    ------
+    numpy.linalg.LinAlgError
+        If a is not square.
+    ValueError
+        If a is empty or has an element that is not finite.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.linalg.sqrtm([[4.0, 0.0], [0.0, 9.0]]).round(12)
+    array([[2., 0.],
+           [0., 3.]])
+    """
+    def of_one(a):
+        found = _served("sqrtm", a)(a)
+        return found.real if a.dtype.kind != "c" and not np.any(found.imag) else found
+
+    return _each(of_one, _matrix("linalg.sqrtm", a, True))
+
+
+def matrix_power(a, n):
+    """A whole power of a square matrix; a negative one is of the inverse.
+
+    Parameters
+    ----------
+    a : array_like
+        A square matrix, real or complex.
+    n : int
+        The power.
+
+    Returns
+    -------
+    ndarray
+
+    Raises
+    ------
+    numpy.linalg.LinAlgError
+        If a is not square, or singular and n negative.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.linalg.matrix_power([[1.0, 1.0], [0.0, 1.0]], 3)
+    array([[1., 3.],
+           [0., 1.]])
+    """
+    n = whole_number("linalg.matrix_power", "n", n)
+    a = _matrix("linalg.matrix_power", a, True)
+    if n < 0:
+        return matrix_power(inv(a), -n)
+    return _each(lambda a: _served("matrix_power", a)(a, n), a)
+
+
+def solve_sylvester(a, b, q):
+    """The solution x of a x + x b = q.
+
+    Parameters
+    ----------
+    a : array_like
+        A square matrix of order m.
+    b : array_like
+        A square matrix of order n.
+    q : array_like
+        An m by n matrix.
+
+    Returns
+    -------
+    ndarray
+
+    Raises
+    ------
+    numpy.linalg.LinAlgError
+        If a or b is not square, or eigenvalues of a and -b meet.
+    ValueError
+        If q does not fit.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.linalg.solve_sylvester([[1.0]], [[2.0]], [[6.0]])
+    array([[2.]])
+    """
+    a, b = _matrix("linalg.solve_sylvester", a, True), _matrix("linalg.solve_sylvester", b, True, "b")
+    q = _matrix("linalg.solve_sylvester", q, argument="q")
+    return _served("solve_sylvester", a, b, q)(a, b, q, 0)
+
+
+def solve_lyapunov(a, q):
+    """The solution x of a x + x a^H = q (continuous time).
+
+    Parameters
+    ----------
+    a, q : array_like
+        Square matrices of one order.
+
+    Returns
+    -------
+    ndarray
+
+    Raises
+    ------
+    numpy.linalg.LinAlgError
+        If a matrix is not square, or eigenvalues of a and -a^H meet.
+    ValueError
+        If q does not fit.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.linalg.solve_lyapunov([[-1.0]], [[-2.0]])
+    array([[1.]])
+    """
+    a, q = _matrix("linalg.solve_lyapunov", a, True), _matrix("linalg.solve_lyapunov", q, True, "q")
+    return _served("solve_lyapunov", a, q)(a, q, 0)
+
+
+def solve_discrete_lyapunov(a, q):
+    """The solution x of a x a^H - x + q = 0 (discrete time).
+
+    Parameters
+    ----------
+    a, q : array_like
+        Square matrices of one order.
+
+    Returns
+    -------
+    ndarray
+
+    Raises
+    ------
+    numpy.linalg.LinAlgError
+        If a matrix is not square, or the product of two eigenvalues of a is 1.
+    ValueError
+        If q does not fit.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.linalg.solve_discrete_lyapunov([[0.5]], [[3.0]])
+    array([[4.]])
+    """
+    a = _matrix("linalg.solve_discrete_lyapunov", a, True)
+    q = _matrix("linalg.solve_discrete_lyapunov", q, True, "q")
+    return _served("solve_lyapunov", a, q)(a, q, 1)
+
+
+def solve_banded(bands, ab, b):
+    """The solution x of a x = b for a matrix with few diagonals.
+
+    Parameters
+    ----------
+    bands : (int, int)
+        How many diagonals are below and above the main one.
+    ab : array_like
+        The diagonals in rows, the topmost first: a[i, j] is at row u + i - j, column j.
+    b : array_like
+        A vector, or a matrix with a right side in each column.
+
+    Returns
+    -------
+    ndarray
+        Of the shape of b.
+
+    Raises
+    ------
+    numpy.linalg.LinAlgError
+        If a is singular.
+    ValueError
+        If the sizes disagree.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.linalg.solve_banded((0, 1), [[0.0, 1.0], [1.0, 1.0]], [3.0, 2.0])
+    array([1., 2.])
+    """
+    below, above = bands
+    ab, b = _matrix("linalg.solve_banded", ab, argument="ab"), as_array(b)
+    if b.ndim == 1:
+        return _served("solve_banded", ab, b)(ab, b, below, above)
+    return _served("solve_banded_many", ab, b)(ab, b, below, above)
+
+
+def charpoly(a):
+    """The coefficients of the characteristic polynomial det(t - a), the constant first.
+
+    Parameters
+    ----------
+    a : array_like
+        A square matrix, real or complex.
+
+    Returns
+    -------
+    ndarray
+
+    Raises
+    ------
+    numpy.linalg.LinAlgError
+        If a is not square.
+    ValueError
+        If a is empty or has an element that is not finite.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.linalg.charpoly([[1.0, 0.0], [0.0, 2.0]]).round(12)
+    array([ 2., -3.,  1.])
+    """
+    return _each(lambda a: _served("charpoly", a)(a), _matrix("linalg.charpoly", a, True))
+
+
+def is_positive_definite(a):
+    """Whether a matrix is exactly symmetric (Hermitian) with eigenvalues that are all above 0.
+
+    Parameters
+    ----------
+    a : array_like
+        A square matrix, real or complex.
+
+    Returns
+    -------
+    bool
+
+    Raises
+    ------
+    numpy.linalg.LinAlgError
+        If a is not square.
+    ValueError
+        If a is empty or has an element that is not finite.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.linalg.is_positive_definite([[2.0, 1.0], [1.0, 2.0]])
+    True
+    """
+    return bool(_served("is_positive_definite", _matrix("linalg.is_positive_definite", a, True))(as_array(a)))
+
+
+def kron(a, b):
+    """The Kronecker product of two matrices.
+
+    Parameters
+    ----------
+    a, b : array_like
+        Matrices.
+
+    Returns
+    -------
+    ndarray
+
+    Raises
+    ------
+    ValueError
+        If a matrix is empty.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.linalg.kron([[1.0, 2.0]], [[1.0], [1.0]])
+    array([[1., 2.],
+           [1., 2.]])
+    """
+    a, b = _matrix("linalg.kron", a), _matrix("linalg.kron", b, argument="b")
+    return _served("kron", a, b)(a, b)
+
+
+def toeplitz(c, r=None):
+    """The matrix whose diagonals are constant.
+
+    Parameters
+    ----------
+    c : array_like
+        The first column.
+    r : array_like, optional
+        The first row, whose first element is not read; the conjugate of c by default.
+
+    Returns
+    -------
+    ndarray
+
+    Raises
+    ------
+    ValueError
+        If c is empty.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.linalg.toeplitz([1.0, 2.0, 3.0])
+    array([[1., 2., 3.],
+           [2., 1., 2.],
+           [3., 2., 1.]])
+    """
+    c = as_array(c)
+    r = c.conj() if r is None else as_array(r)
+    return _served("toeplitz", c, r)(2, len(c), c, r)
+
+
+def companion(p):
+    """The companion matrix of a polynomial, whose eigenvalues are its roots.
+
+    Parameters
+    ----------
+    p : array_like
+        Coefficients, the highest power first, as of `scipy.linalg.companion`.
+
+    Returns
+    -------
+    ndarray
+
+    Raises
+    ------
+    ValueError
+        If there are fewer than two coefficients.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.linalg.companion([1.0, -3.0, 2.0])
+    array([[ 3., -2.],
+           [ 1.,  0.]])
+    """
+    p = as_array(p)
+    return _served("toeplitz", p)(4, len(p), p, p[:0])

@@ -1,0 +1,508 @@
+"""Polynomials by their coefficients in ascending powers, the constant first, as of `numpy.polynomial`;
+real or complex.
+"""
+
+import numpy as np
+
+from .topical import Result, result, served, vector, whole_number
+
+__all__ = ["PartialFractions", "Roots", "add", "compose", "derivative", "divide", "evaluate",
+           "evaluate_matrix", "from_roots", "gcd", "integral", "lcm", "multiple_roots",
+           "multiply", "partial_fractions", "roots", "subtract"]
+
+core = served("poly")
+
+
+def _given(function, *polynomials):
+    given = [vector(p, f"poly.{function}", "coefficients") for p in polynomials]
+    return given, any(p.dtype.kind == "c" for p in given)
+
+
+def _of(function, *polynomials):
+    given, is_complex = _given(function, *polynomials)
+    return getattr(core, function + "_complex" if is_complex else function)(*given)
+
+
+@result
+class Roots(Result):
+    """The distinct roots of a polynomial.
+
+    Attributes
+    ----------
+    roots : ndarray of complex128
+        Each root once.
+    multiplicities : ndarray of int32
+        How often it is one.
+    """
+
+    roots: np.ndarray
+    multiplicities: np.ndarray
+
+
+@result
+class PartialFractions(Result):
+    """A rational function as a polynomial and a sum over its poles.
+
+    Attributes
+    ----------
+    polynomial : ndarray
+        What is left of the division.
+    poles : ndarray of complex128
+        Each as often as it is one, equal ones together.
+    residues : ndarray of complex128
+        Beside the k-th of equal poles the factor of 1 / (x - pole)^k.
+    """
+
+    polynomial: np.ndarray
+    poles: np.ndarray
+    residues: np.ndarray
+
+
+def add(p, q):
+    """The sum of two polynomials.
+
+    Parameters
+    ----------
+    p, q : array_like
+        Coefficients.
+
+    Returns
+    -------
+    ndarray
+
+    Raises
+    ------
+    ValueError
+        If a coefficient is not finite or the result overflows.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.poly.add([1.0, 2.0], [1.0])
+    array([2., 2.])
+    """
+    return _of("add", p, q)
+
+
+def subtract(p, q):
+    """The difference of two polynomials.
+
+    Parameters
+    ----------
+    p, q : array_like
+        Coefficients.
+
+    Returns
+    -------
+    ndarray
+
+    Raises
+    ------
+    ValueError
+        If a coefficient is not finite or the result overflows.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.poly.subtract([1.0, 2.0], [1.0])
+    array([0., 2.])
+    """
+    return _of("subtract", p, q)
+
+
+def multiply(p, q):
+    """The product of two polynomials.
+
+    Parameters
+    ----------
+    p, q : array_like
+        Coefficients.
+
+    Returns
+    -------
+    ndarray
+
+    Raises
+    ------
+    ValueError
+        If a coefficient is not finite or the result overflows.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.poly.multiply([1.0, 1.0], [1.0, -1.0])
+    array([ 1.,  0., -1.])
+    """
+    return _of("multiply", p, q)
+
+
+def divide(p, q):
+    r"""Quotient and remainder of a division.
+
+    .. math:: p = s q + r
+
+    Parameters
+    ----------
+    p, q : array_like
+        Coefficients.
+
+    Returns
+    -------
+    two ndarrays
+
+    Raises
+    ------
+    ValueError
+        If q is 0, or a coefficient is not finite.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.poly.divide([1.0, 0.0, 1.0], [1.0, 1.0])
+    (array([-1.,  1.]), array([2.]))
+    """
+    return _of("divide", p, q)
+
+
+def gcd(p, q, tolerance=1e-10):
+    """The monic divisor of the highest degree of polynomials within a relative distance of p and q (Z.
+    Zeng, "Computing multiple roots of inexact polynomials", 2005).
+
+    Parameters
+    ----------
+    p, q : array_like
+        Coefficients.
+    tolerance : float
+        The distance, relative to the norm of the coefficients.
+
+    Returns
+    -------
+    ndarray
+
+    Raises
+    ------
+    ValueError
+        If both are 0, or a coefficient is not finite.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.poly.gcd([2.0, 3.0, 1.0], [3.0, 4.0, 1.0]).round(12)
+    array([1., 1.])
+    """
+    given, is_complex = _given("gcd", p, q)
+    return (core.gcd_complex if is_complex else core.gcd)(*given, float(tolerance))[0]
+
+
+def lcm(p, q, tolerance=1e-10):
+    """The monic least common multiple of real polynomials within a relative distance of p and q.
+
+    Parameters
+    ----------
+    p, q : array_like
+        Coefficients.
+    tolerance : float
+        The distance, relative to the norm of the coefficients.
+
+    Returns
+    -------
+    ndarray
+
+    Raises
+    ------
+    ValueError
+        If one is 0, or a coefficient is not finite.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.poly.lcm([1.0, 1.0], [2.0, 3.0, 1.0]).round(12)
+    array([2., 3., 1.])
+    """
+    given, _ = _given("lcm", p, q)
+    return core.lcm(*given, float(tolerance))
+
+
+def evaluate(p, x):
+    r"""The values of a polynomial, as accurate as if computed with twice the digits (S. Graillat, P.
+    Langlois and N. Louvet, "Compensated Horner scheme", 2005).
+
+    .. math:: p(x) = \sum_k p_k x^k
+
+    Parameters
+    ----------
+    p : array_like
+        Coefficients.
+    x : float, complex or array_like
+        Where, of any shape.
+
+    Returns
+    -------
+    float, complex or ndarray
+        Of the shape of x.
+
+    Raises
+    ------
+    ValueError
+        If there is no coefficient, or one is not finite.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.poly.evaluate([1.0, 0.0, 2.0], [0.0, 3.0])
+    array([ 1., 19.])
+    """
+    x = np.asarray(x)
+    given, is_complex = _given("evaluate", p)
+    run = core.evaluate_complex if is_complex or x.dtype.kind == "c" else core.evaluate
+    return run(*given, x.ravel()).reshape(x.shape)[()]
+
+
+def evaluate_matrix(p, a):
+    r"""A polynomial of a square matrix (M. S. Paterson and L. J. Stockmeyer, "On the number of nonscalar
+    multiplications necessary to evaluate polynomials", 1973).
+
+    .. math:: p(A) = \sum_k p_k A^k
+
+    Parameters
+    ----------
+    p : array_like
+        Coefficients.
+    a : array_like
+        A square matrix.
+
+    Returns
+    -------
+    ndarray
+
+    Raises
+    ------
+    numpy.linalg.LinAlgError
+        If a is not square.
+    ValueError
+        If there is no coefficient, or one is not finite.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.poly.evaluate_matrix([1.0, 1.0], [[0.0, 1.0], [1.0, 0.0]])
+    array([[1., 1.],
+           [1., 1.]])
+    """
+    a = np.asarray(a)
+    given, is_complex = _given("evaluate_matrix", p)
+    run = core.evaluate_matrix_complex if is_complex or a.dtype.kind == "c" else core.evaluate_matrix
+    return run(*given, a, 1)
+
+
+def derivative(p, m=1):
+    """The m-th derivative.
+
+    Parameters
+    ----------
+    p : array_like
+        Coefficients.
+    m : int
+        Which derivative.
+
+    Returns
+    -------
+    ndarray
+
+    Raises
+    ------
+    ValueError
+        If m is negative, or there is no coefficient.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.poly.derivative([1.0, 2.0, 3.0])
+    array([2., 6.])
+    """
+    m = whole_number("poly.derivative", "m", m, 0, "ErrNegativeCount")
+    given, is_complex = _given("derivative", p)
+    return (core.derivative_complex if is_complex else core.derivative)(*given, m)
+
+
+def integral(p, constant=0.0):
+    """The integral with a given value at 0.
+
+    Parameters
+    ----------
+    p : array_like
+        Coefficients.
+    constant : float or complex
+        The value at 0.
+
+    Returns
+    -------
+    ndarray
+
+    Raises
+    ------
+    ValueError
+        If there is no coefficient, or one is not finite.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.poly.integral([1.0, 2.0])
+    array([0., 1., 1.])
+    """
+    given, is_complex = _given("integral", p)
+    if is_complex or np.iscomplexobj(constant):
+        return core.integral_complex(*given, complex(constant))
+    return core.integral(*given, float(constant))
+
+
+def compose(p, q):
+    """The polynomial p(q(x)).
+
+    Parameters
+    ----------
+    p, q : array_like
+        Coefficients.
+
+    Returns
+    -------
+    ndarray
+
+    Raises
+    ------
+    ValueError
+        If a coefficient is not finite or the result overflows.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.poly.compose([0.0, 0.0, 1.0], [1.0, 1.0])
+    array([1., 2., 1.])
+    """
+    return _of("compose", p, q)
+
+
+def from_roots(roots):
+    """The monic polynomial with these roots; real where they are real or come in conjugate pairs.
+
+    Parameters
+    ----------
+    roots : array_like
+        Each root as often as it is one.
+
+    Returns
+    -------
+    ndarray
+
+    Raises
+    ------
+    ValueError
+        If a root is not finite.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.poly.from_roots([1.0, 2.0])
+    array([ 2., -3.,  1.])
+    """
+    given = vector(roots, "poly.from_roots", "roots")
+    left = list(given[given.imag != 0]) if given.dtype.kind == "c" else []
+    while left:
+        one = left.pop()
+        near = [i for i, other in enumerate(left) if abs(other - np.conj(one)) <= 1e-10 * abs(one)]
+        if not near:
+            return core.from_roots_complex(given)
+        left.pop(near[0])
+    return core.from_roots(given)
+
+
+def roots(p):
+    """All roots, each as often as its multiplicity.
+
+    Parameters
+    ----------
+    p : array_like
+        Coefficients.
+
+    Returns
+    -------
+    ndarray of complex128
+
+    Raises
+    ------
+    ValueError
+        If the polynomial is constant, or a coefficient is not finite.
+
+    Examples
+    --------
+    >>> import numpy as np, qx
+    >>> np.sort(qx.poly.roots([2.0, -3.0, 1.0]).real)
+    array([1., 2.])
+    """
+    found = multiple_roots(p)
+    return np.repeat(found.roots, found.multiplicities)
+
+
+def multiple_roots(p, tolerance=1e-10):
+    """The distinct roots with their multiplicities: a multiple root is as accurate as a simple one (Z.
+    Zeng, "Computing multiple roots of inexact polynomials", 2005).
+
+    Parameters
+    ----------
+    p : array_like
+        Coefficients.
+    tolerance : float
+        By how much coefficients may be changed to make roots multiple.
+
+    Returns
+    -------
+    Roots
+
+    Raises
+    ------
+    ValueError
+        If the polynomial is constant, or a coefficient is not finite.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.poly.multiple_roots([1.0, 3.0, 3.0, 1.0])
+    Roots
+      roots           [-1.+0.j]
+      multiplicities  [3]
+    """
+    given, is_complex = _given("multiple_roots", p)
+    run = core.multiple_roots_complex if is_complex else core.multiple_roots
+    _, refined, _, multiplicities = run(*given, 1, float(tolerance))
+    return Roots(refined, multiplicities)
+
+
+def partial_fractions(numerator, denominator, tolerance=1e-10):
+    r"""The partial fractions of a real rational function.
+
+    .. math:: \frac{n(x)}{d(x)} = p(x) + \sum_{z,k} \frac{r_{zk}}{(x - z)^k}
+
+    Parameters
+    ----------
+    numerator, denominator : array_like
+        Coefficients.
+    tolerance : float
+        By how much coefficients may be changed to make poles multiple.
+
+    Returns
+    -------
+    PartialFractions
+
+    Raises
+    ------
+    ValueError
+        If the denominator is 0, or a coefficient is not finite.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.poly.partial_fractions([1.0], [2.0, 3.0, 1.0]).residues.real.round(12)
+    array([-1.,  1.])
+    """
+    given, _ = _given("partial_fractions", numerator, denominator)
+    return PartialFractions(*core.partial_fractions(*given, float(tolerance)))
