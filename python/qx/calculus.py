@@ -5,6 +5,7 @@ import math
 
 import numpy as np
 
+from . import windows
 from .topical import LAST, Result, along, chosen, refuse, result, served, whole_number
 from .topical.axes import as_array
 
@@ -421,23 +422,32 @@ def velocity(acceleration, fs, drift=1, cutoff=None, axis=LAST):
     >>> a = np.cos(2 * np.pi * 5 * t) + 0.3
     >>> found = qx.calculus.velocity(a, 1000)
     >>> round(float(np.ptp(found)) * np.pi * 5, 2)
-    1.08
+    1.0
     """
     return _motion(acceleration, fs, drift, cutoff, 1, axis)
 
 
 def _motion(acceleration, fs, drift, cutoff, times, axis):
-    from . import filters, signals
+    from . import filters
     if not fs > 0:
         refuse("calculus.velocity", "fs", f"must be above 0; {fs} came", "ErrSamplingNotPositive")
     found = acceleration
     for _ in range(times):
         found = cumulative(found, dx=1 / fs, axis=axis)
     if drift is not None:
-        found = signals.detrend(found, drift, axis)
+        found = along(lambda channel: _driftless(channel, drift), found, axis)
     if cutoff is not None:
         found = filters.butterworth(2, cutoff, "highpass", fs).zero_phase(found, axis)
     return found
+
+
+def _driftless(channel, order):
+    """The values less a polynomial of least squares under a Blackman window, in which vibrations of some
+    periods and more leave next to nothing."""
+    n = len(channel)
+    order = whole_number("calculus.displacement", "drift", order, 0, "ErrPolynomialOrderNegative")
+    weights = windows.blackman(n + 2)[1:-1]  # none is 0
+    return channel - core.velocity(np.linspace(-1, 1, n), channel, order, weights, 0, [], [])[0]
 
 
 def displacement(acceleration, fs, drift=2, cutoff=None, axis=LAST):
@@ -474,6 +484,6 @@ def displacement(acceleration, fs, drift=2, cutoff=None, axis=LAST):
     >>> a = -(2 * np.pi * 5)**2 * np.sin(2 * np.pi * 5 * t) + 0.3
     >>> found = qx.calculus.displacement(a, 1000)
     >>> round(float(np.ptp(found)), 1)
-    2.2
+    2.0
     """
     return _motion(acceleration, fs, drift, cutoff, 2, axis)

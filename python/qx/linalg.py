@@ -216,8 +216,8 @@ def _each(function, *stacks):
         return np.stack(parts).reshape(*shape, *parts[0].shape)
 
     if isinstance(found[0], Result):
-        return type(found[0])(*(None if parts[0] is None else stacked(parts) for parts in zip(
-            *((getattr(one, name) for name in one.__dataclass_fields__) for one in found))))
+        fields = {name: [getattr(one, name) for one in found] for name in found[0].__dataclass_fields__}
+        return type(found[0])(*(None if parts[0] is None else stacked(parts) for parts in fields.values()))
     return stacked(found)
 
 

@@ -57,7 +57,7 @@ class Names(unittest.TestCase):
                     for section in SECTIONS:
                         self.assertIn(section, value.__doc__, f"{topic}.{name}")
                     for argument in inspect.signature(value).parameters:
-                        self.assertRegex(value.__doc__, rf"(?m)^    (\w+, )*{argument}(, \w+)* : ",
+                        self.assertRegex(value.__doc__, rf"(?m)^    (\*?\w+, )*\*?{argument}(, \w+)* : ",
                                          f"{topic}.{name}")
 
     def test_examples_give_what_they_show(self):

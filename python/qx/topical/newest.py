@@ -9,8 +9,8 @@ import importlib
 from ..calls import export, hint
 from ..library import library
 
-TOPICS = ("filters", "fft", "windows", "spectra", "signals", "noise", "multirate", "linalg", "poly",
-          "interpolate", "calculus", "special", "coordinates")  # in the order in which they are shown
+TOPICS = ("filters", "fft", "windows", "spectra", "signals", "noise", "multirate", "linalg", "poly", "fit",
+          "interpolate", "calculus", "stats", "special", "measure", "coordinates")  # in the order in which they are shown
 
 NEWEST = {
     "filters": {
@@ -120,6 +120,7 @@ NEWEST = {
     "calculus": {
         "integrate": "NumerIntegration_2017_head", "integrate2": "NumerIntegration2D_2017_head",
         "cumulative": "Integral_2017", "derivative": "Derivative85",
+        "velocity": "PolyFit81_head",
     },
     "special": {
         "gamma": "QX_Gamma_85", "gammaln": "QX_LnGamma", "gammainc": "QX_Gamma_85",
@@ -145,6 +146,32 @@ NEWEST = {
         "rotate_euler": "CoordRotationEuler2011_head",
         "euler_to_matrix": "Euler2Direction2011_head",
         "matrix_to_euler": "Direction2Euler2011_head", "convert": "CoordConversion_head",
+    },
+    "fit": {
+        "line": "BoundLinearFit_head", "line_absolute": "BoundLinearFitLAR_head",
+        "line_bisquare": "BoundLinearFitBi_head", "polynomial": "PolyFit81_head",
+        "exponential": "BoundExpFit_head", "power": "BoundPowerFit_head",
+        "logarithm": "BoundLogFit_head", "gaussian": "BoundGaussianFit_head",
+        "linear": "GenLSFit80_head", "curve": "GetNewCoef_head",
+        "Fit_covariance": "GenLSFit80_head", "Fit_confidence": "ConfBndGenLS_head",
+        "Fit_prediction": "PredBndGenLS_head", "SmoothingSpline": "CubicSplineFit_head",
+        "BSpline": "BSplineFit_head",
+    },
+    "stats": {
+        "mean": "Mean_head", "rms": "RMS_head", "rms_complex": "CxRMS_head",
+        "moment": "Moment_head", "median": "Median_head", "mode": "ModeH", "mse": "MSE_head",
+        "histogram": "histgran_head", "histogram_intervals": "GenHistH",
+        "contingency": "Contingency_head", "anova": "Anova1Way_head", "anova2": "Anova2Way_head",
+        "anova3": "ANOVA3Way_head", "norm_cdf": "NormDist_head", "norm_ppf": "InvNdist_head",
+        "t_cdf": "TDist_head", "t_ppf": "InvTdist_head", "chi2_cdf": "ChiSquare_head",
+        "chi2_ppf": "InvChiSquare_head", "f_cdf": "FDist_head", "f_ppf": "InvFDist_head",
+    },
+    "measure": {
+        "PeakFinder": "PeakD", "levels": "StateLevels", "pulses": "PulseMeasEx",
+        "pulses_transition": "TransMeas", "tone": "SingleToneMeasurement",
+        "tones": "MultipleToneMeasurements", "harmonics": "HarmonicAnalysis",
+        "trigger": "Triggerh_86", "delay": "Rxy80", "delay_spectrum": "ReOXFFTH80",
+        "sound_level": "RMS_head",
     },
 }
 

@@ -1,0 +1,839 @@
+"""Fits with parameters by name, their standard errors, bands, and splines through noisy data.
+
+    fit = qx.fit.exponential(x, y)
+    fit.parameters["b"], fit.errors["b"]
+    fit.predict(5.0)
+    low, high = fit.confidence(5.0)         # of the curve; fit.prediction() of one more value
+
+Standard errors and bands take the scatter of the residuals; those of models that are not linear in their
+parameters hold to first order.
+"""
+
+import inspect
+import math
+
+import numpy as np
+
+from .outcomes import QxWarning, warn
+from .topical import Result, chosen, refuse, result, served, vector, whole_number
+
+__all__ = ["BSpline", "Fit", "SmoothingSpline", "curve", "exponential", "gaussian", "line", "linear",
+           "logarithm", "polynomial", "power"]
+
+core = served("fit")
+
+EMPTY = np.empty(0)
+NATURAL = 2.71828  # the exports take these digits for e
+TOLERANCE, ITERATIONS = 1e-12, 2000
+METHODS = {"least squares": 0, "absolute": 1, "bisquare": 2}
+
+
+@result
+class Fit(Result):
+    """A fitted model; unpacked, the parameters as an array and their covariance, as of
+    `scipy.optimize.curve_fit`.
+
+    Attributes
+    ----------
+    formula : str
+        The model.
+    parameters : dict
+        Their values by their names.
+    errors : dict
+        Their standard errors; 0 of fixed ones.
+    covariance : ndarray
+        Of the parameters, in their order.
+    r_square : float
+        The part of the variance that is explained.
+    rmse : float
+        The root of the (weighted) sum of squared residuals over the degrees of freedom.
+    dof : int
+        The degrees of freedom: weighted samples less free parameters.
+    residuals, values : ndarray
+        y less the model, and the model, at the samples.
+    """
+
+    formula: str
+    parameters: dict
+    errors: dict
+    covariance: np.ndarray
+    r_square: float
+    rmse: float
+    dof: int
+    residuals: np.ndarray
+    values: np.ndarray
+
+    def __iter__(self):
+        return iter((np.array([*self.parameters.values()]), self.covariance))
+
+    def __len__(self):
+        return 2
+
+    def __getitem__(self, name):
+        return self.parameters[name]
+
+    def _shown(self):
+        rows = [("formula", self.formula)]
+        rows += [(name, f"{value:.6g} +- {self.errors[name]:.2g}") for name, value in self.parameters.items()]
+        return rows + [("r_square", f"{self.r_square:.6g}"), ("rmse", f"{self.rmse:.6g}"),
+                       ("dof", str(self.dof))]
+
+    def predict(self, x):
+        """The model at x.
+
+        Parameters
+        ----------
+        x : float or array_like
+            Where, of any shape.
+
+        Returns
+        -------
+        float or ndarray
+        """
+        return self._model.value(np.asarray(x, float), np.array([*self.parameters.values()]))[()]
+
+    def confidence(self, x=None, level=0.95):
+        """Bounds of the curve at each x by itself.
+
+        Parameters
+        ----------
+        x : float or array_like, optional
+            Where; at the samples by default.
+        level : float
+            The confidence, between 0 and 1.
+
+        Returns
+        -------
+        two floats or ndarrays
+            Lower and upper bounds.
+        """
+        return self._band(core.Fit_confidence, x, level)
+
+    def prediction(self, x=None, level=0.95):
+        """Bounds of one more observation of weight 1 at each x; arguments and results as of `confidence`."""
+        return self._band(core.Fit_prediction, x, level)
+
+    def intervals(self, level=0.95):
+        """Confidence intervals of the parameters: lower and upper bound by their names; of fixed ones their
+        value twice."""
+        found = self._bounds(core.Fit_confidence, self._x[:0], level)
+        free = iter(zip(*found[:2]))
+        return {name: (float(value), float(value)) if is_fixed else tuple(map(float, next(free)))
+                for (name, value), is_fixed in zip(self.parameters.items(), self._fixed)}
+
+    def _bounds(self, bounds, x, level):
+        """The export's bounds of the model that is linearised at the parameters, at the samples and at x."""
+        if not 0 < level < 1:
+            refuse("fit.Fit", "level", f"must be between 0 and 1; {level} came", "ErrProbabilityOutOfRange")
+        p = np.array([*self.parameters.values()])
+        free = ~self._fixed
+        rows = self._model.jacobian(np.concatenate([self._x, x]), p)[:, free]
+        weights = np.concatenate([self._w if len(self._w) else np.ones(len(self._x)), np.zeros(len(x))])
+        linear = rows @ p[free]
+        observed = linear + np.concatenate([self.residuals, np.zeros(len(x))])
+        found = bounds(np.ascontiguousarray(rows), observed, weights, p[free], float(level))
+        return [*found[:-2], *(curve - linear for curve in found[-2:])]
+
+    def _band(self, bounds, x, level):
+        at = self._x if x is None else np.asarray(x, float)
+        shape = at.shape[:1 - self._x.ndim or None]  # without that of a row
+        new = at.reshape(-1, *self._x.shape[1:]) if x is not None else self._x[:0]
+        lower, upper = self._bounds(bounds, new, level)[-2:]
+        if x is not None:
+            lower, upper = (one[len(self._x):].reshape(shape) for one in (lower, upper))
+        middle = self.predict(at)
+        return middle + lower[()], middle + upper[()]
+
+    def plot(self, axes=None, level=0.95):
+        """Draws samples, model and the bounds of the curve with matplotlib.
+
+        Parameters
+        ----------
+        axes : matplotlib Axes, optional
+            Where to draw; new ones by default.
+        level : float
+            The confidence of the bounds.
+
+        Returns
+        -------
+        matplotlib Axes
+        """
+        if axes is None:
+            from matplotlib import pyplot
+            axes = pyplot.subplots()[1]
+        at = np.linspace(self._x.min(), self._x.max(), 400)
+        axes.plot(self._x, self.residuals + self.values, ".", label="samples")
+        axes.plot(at, self.predict(at), label=self.formula)
+        axes.fill_between(at, *self.confidence(at, level), alpha=0.25, label=f"{level:.0%}")
+        axes.legend(frameon=False)
+        return axes
+
+
+class _Model:
+    """A formula, the names of its parameters, its values, and its derivatives by them in columns."""
+
+    def __init__(self, formula, names, value, jacobian=None):
+        self.formula, self.names, self.value = formula, list(names), value
+        self.jacobian = jacobian or self._differences
+
+    def _differences(self, x, p):
+        columns = []
+        for j, one in enumerate(p):
+            step = np.cbrt(np.finfo(float).eps) * (abs(one) or 1.0)
+            above, below = p.copy(), p.copy()
+            above[j], below[j] = one + step, one - step
+            columns.append((self.value(x, above) - self.value(x, below)) / (above[j] - below[j]))
+        return np.stack(columns, -1)
+
+
+def _samples(function, x, y, sigma):
+    """x, y and weights 1 / sigma^2, or none."""
+    x, y = (vector(one, f"fit.{function}", name).astype(float) for one, name in ((x, "x"), (y, "y")))
+    if len(x) != len(y):
+        refuse(f"fit.{function}", "x, y", f"must be of one length; {len(x)} and {len(y)} came",
+               "ErrSizeMismatch")
+    if sigma is None:
+        return x, y, EMPTY
+    sigma = np.broadcast_to(np.asarray(sigma, float), y.shape)
+    if not np.all(sigma > 0):
+        refuse(f"fit.{function}", "sigma", "must be above 0", "ErrNotStrictlyPositive")
+    return x, y, 1 / sigma**2
+
+
+def _finished(model, x, y, w, p, fixed=None, absolute=False):
+    """The Fit of parameters that were found."""
+    p = np.array([float(one) for one in p])
+    fixed = np.zeros(len(p), bool) if fixed is None else np.asarray(fixed, bool)
+    values = model.value(x, p)
+    residuals = y - values
+    dof = int(np.count_nonzero(w) if len(w) else len(x)) - int(np.sum(~fixed))
+    weighted = residuals**2 if not len(w) else w * residuals**2
+    sse = float(np.sum(weighted))
+    about = y - (np.average(y, weights=w) if len(w) else np.mean(y))
+    total = float(np.sum(about**2 if not len(w) else w * about**2))
+    variance = sse / dof if dof > 0 else math.inf
+    covariance = np.zeros((len(p), len(p)))
+    free = np.flatnonzero(~fixed)
+    if len(free) and len(x) >= len(free):
+        rows = np.ascontiguousarray(model.jacobian(x, p)[:, free])
+        if np.all(np.isfinite(rows)):
+            inverse = core.Fit_covariance(rows, residuals, w, 0, 1)[2]
+            covariance[np.ix_(free, free)] = inverse if absolute else inverse * variance
+        else:
+            covariance[np.ix_(free, free)] = np.nan
+    errors = np.sqrt(np.maximum(np.diagonal(covariance), 0))
+    found = Fit(model.formula, dict(zip(model.names, p.tolist())), dict(zip(model.names, errors.tolist())),
+                covariance, 1 - sse / total if total else 1.0, math.sqrt(variance), dof, residuals, values)
+    found._model, found._x, found._w, found._fixed = model, x, w, fixed
+    return found
+
+
+def _limits(function, names, bounds, guess, fixed):
+    """Lower and upper bounds and start values in the order of the names."""
+    bounds = {**(bounds or {}), **{name: (value, value) for name, value in fixed.items()}}
+    for name in {*bounds, *(guess or {})} - set(names) - set(fixed):
+        chosen(f"fit.{function}", "bounds, guess", name, {one: one for one in names})
+    every = [*names, *(name for name in fixed if name not in names)]
+    lower = [float(bounds.get(name, (-math.inf, math.inf))[0]) for name in every]
+    upper = [float(bounds.get(name, (-math.inf, math.inf))[1]) for name in every]
+    if any(not low <= high for low, high in zip(lower, upper)):
+        refuse(f"fit.{function}", "bounds", "a lower one is above its upper one", "ErrBoundsCrossed")
+    start = []
+    if guess:
+        if missing := [name for name in names if name not in guess]:
+            refuse(f"fit.{function}", "guess", f"has no value for {', '.join(missing)}", "ErrFitStartValues")
+        start = [float({**guess, **fixed}[name]) for name in every]
+    return lower, upper, start
+
+
+def _bounded(function, run, model, x, y, w, bounds, guess, method, fixed):
+    """A fit by an export that knows bounds, start values and methods."""
+    code = chosen(f"fit.{function}", "method", method, METHODS)
+    lower, upper, start = _limits(function, model.names, bounds, guess, fixed)
+    p = run(y, x, w, start, lower, upper, code)
+    return _finished(model, x, y, w, p[:len(model.names)],
+                     [low == high for low, high in zip(lower, upper)][:len(model.names)])
+
+
+def line(x, y, sigma=None, bounds=None, method="least squares"):
+    """A line y = a x + b.
+
+    Parameters
+    ----------
+    x, y : array_like
+        The samples.
+    sigma : float or array_like, optional
+        The standard deviation of each y, up to a factor.
+    bounds : dict, optional
+        By the name of a parameter its lower and upper bound; equal ones fix it.
+    method : {"least squares", "absolute", "bisquare"}
+        What is made least: the squares of the residuals, their absolute values, or squares without those
+        far off.
+
+    Returns
+    -------
+    Fit
+        With the parameters a, the slope, and b.
+
+    Raises
+    ------
+    ValueError
+        If x and y differ in length, there are fewer samples than parameters, a sigma is not above 0,
+        bounds cross, or a word is none of its words.
+    QxError
+        If the fit does not come to an end.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.fit.line([0.0, 1.0, 2.0, 3.0], [1.0, 3.1, 4.9, 7.0])
+    Fit
+      formula   a x + b
+      a         1.98 +- 0.042
+      b         1.03 +- 0.079
+      r_square  0.999083
+      rmse      0.0948683
+      dof       2
+    """
+    x, y, w = _samples("line", x, y, sigma)
+    model = _Model("a x + b", "ab", lambda x, p: p[0] * x + p[1], lambda x, p: np.stack([x, np.ones(len(x))], -1))
+
+    def run(y, x, w, start, lower, upper, code):
+        if code == 0:
+            return core.line(y, x, w, lower, upper)[1:3]
+        export = core.line_absolute if code == 1 else core.line_bisquare
+        return export(y, x, w, TOLERANCE, ITERATIONS, lower, upper)[2:4]
+
+    return _bounded("line", run, model, x, y, w, bounds, None, method, {})
+
+
+def polynomial(x, y, degree, sigma=None, fixed=None):
+    """A polynomial c0 + c1 x + c2 x^2 + ...
+
+    Parameters
+    ----------
+    x, y : array_like
+        The samples.
+    degree : int
+        The highest power, up to 25.
+    sigma : float or array_like, optional
+        The standard deviation of each y, up to a factor.
+    fixed : dict, optional
+        Values of coefficients by their names, such as {"c0": 0.0}.
+
+    Returns
+    -------
+    Fit
+        With the parameters c0, c1, ...
+
+    Raises
+    ------
+    ValueError
+        If x and y differ in length, there are fewer samples than parameters, a sigma is not above 0,
+        bounds cross, or a word is none of its words.
+    QxError
+        If the fit does not come to an end.
+
+    Examples
+    --------
+    >>> import qx
+    >>> round(qx.fit.polynomial([0.0, 1.0, 2.0, 3.0, 4.0], [1.0, 2.0, 5.0, 10.0, 17.0], 2).parameters['c2'], 9)
+    1.0
+    """
+    degree = whole_number("fit.polynomial", "degree", degree, 0, "ErrPolynomialOrderNegative")
+    if degree > 25:
+        refuse("fit.polynomial", "degree", f"must be at most 25; {degree} came", "ErrPolynomialOrderTooHigh")
+    x, y, w = _samples("polynomial", x, y, sigma)
+    names = [f"c{j}" for j in range(degree + 1)]
+    given = fixed or {}
+    orders = [chosen("fit.polynomial", "fixed", name, {one: j for j, one in enumerate(names)}) for name in given]
+    p = core.polynomial(x, y, degree, w, 0, orders, [float(value) for value in given.values()])[1]
+    terms = ["c0", "c1 x", *(f"c{j} x^{j}" for j in range(2, degree + 1))]
+    formula = " + ".join(terms[:degree + 1] if degree < 5 else [*terms[:3], "...", terms[degree]])
+    model = _Model(formula, names, lambda x, p: np.polynomial.polynomial.polyval(x, p),
+                   lambda x, p: np.vander(x, len(p), True))
+    return _finished(model, x, y, w, p, [name in given for name in names])
+
+
+def _with_offset(offset, formula, names, value, columns):
+    """The model with or without its constant c."""
+    if offset:
+        return _Model(formula + " + c", [*names, "c"], lambda x, p: value(x, p) + p[-1],
+                      lambda x, p: np.stack([*columns(x, p), np.ones(len(x))], -1)), {}
+    return _Model(formula, names, value, lambda x, p: np.stack(columns(x, p), -1)), {"c": 0.0}
+
+
+def exponential(x, y, sigma=None, offset=True, bounds=None, guess=None, method="least squares"):
+    """An exponential y = a exp(b x) + c.
+
+    Parameters
+    ----------
+    x, y : array_like
+        The samples.
+    sigma : float or array_like, optional
+        The standard deviation of each y, up to a factor.
+    offset : bool
+        Whether there is a constant c.
+    bounds : dict, optional
+        By the name of a parameter its lower and upper bound; equal ones fix it.
+    guess : dict, optional
+        Start values by the names of the parameters.
+    method : {"least squares", "absolute", "bisquare"}
+        What is made least: the squares of the residuals, their absolute values, or squares without those
+        far off.
+
+    Returns
+    -------
+    Fit
+        With the parameters a, b, c.
+
+    Raises
+    ------
+    ValueError
+        If x and y differ in length, there are fewer samples than parameters, a sigma is not above 0,
+        bounds cross, or a word is none of its words.
+    QxError
+        If the fit does not come to an end.
+
+    Examples
+    --------
+    >>> import numpy as np, qx
+    >>> x = np.linspace(0, 2, 20)
+    >>> {name: round(value, 6) for name, value in qx.fit.exponential(x, 3 * np.exp(-2 * x) + 1).parameters.items()}
+    {'a': 3.0, 'b': -2.0, 'c': 1.0}
+    """
+    x, y, w = _samples("exponential", x, y, sigma)
+    model, fixed = _with_offset(
+        offset, "a exp(b x)", ["a", "b"], lambda x, p: p[0] * np.exp(p[1] * x),
+        lambda x, p: [np.exp(p[1] * x), p[0] * x * np.exp(p[1] * x)])
+    return _bounded("exponential", lambda y, x, w, start, lower, upper, code: core.exponential(
+        y, x, w, TOLERANCE, ITERATIONS, start, lower, upper, code)[2:5], model, x, y, w, bounds, guess, method, fixed)
+
+
+def power(x, y, sigma=None, offset=True, bounds=None, guess=None, method="least squares"):
+    """A power y = a x^b + c of positive x.
+
+    Parameters
+    ----------
+    x, y : array_like
+        The samples.
+    sigma : float or array_like, optional
+        The standard deviation of each y, up to a factor.
+    offset : bool
+        Whether there is a constant c.
+    bounds : dict, optional
+        By the name of a parameter its lower and upper bound; equal ones fix it.
+    guess : dict, optional
+        Start values by the names of the parameters.
+    method : {"least squares", "absolute", "bisquare"}
+        What is made least: the squares of the residuals, their absolute values, or squares without those
+        far off.
+
+    Returns
+    -------
+    Fit
+        With the parameters a, b, c.
+
+    Raises
+    ------
+    ValueError
+        If x and y differ in length, there are fewer samples than parameters, a sigma is not above 0,
+        bounds cross, or a word is none of its words.
+    QxError
+        If the fit does not come to an end.
+
+    Examples
+    --------
+    >>> import numpy as np, qx
+    >>> x = np.linspace(1, 4, 20)
+    >>> {name: round(value, 6) for name, value in qx.fit.power(x, 3 * x**-0.5 + 1).parameters.items()}
+    {'a': 3.0, 'b': -0.5, 'c': 1.0}
+    """
+    x, y, w = _samples("power", x, y, sigma)
+    if np.any(x <= 0):
+        refuse("fit.power", "x", "must be above 0", "ErrNotStrictlyPositive")
+    model, fixed = _with_offset(
+        offset, "a x^b", ["a", "b"], lambda x, p: p[0] * x**p[1],
+        lambda x, p: [x**p[1], p[0] * x**p[1] * np.log(x)])
+    return _bounded("power", lambda y, x, w, start, lower, upper, code: core.power(
+        y, x, w, TOLERANCE, ITERATIONS, start, lower, upper, code)[2:5], model, x, y, w, bounds, guess, method, fixed)
+
+
+def logarithm(x, y, sigma=None, bounds=None, guess=None, method="least squares"):
+    """A logarithm y = a ln(b x) of positive x.
+
+    Parameters
+    ----------
+    x, y : array_like
+        The samples.
+    sigma : float or array_like, optional
+        The standard deviation of each y, up to a factor.
+    bounds : dict, optional
+        By the name of a parameter its lower and upper bound; equal ones fix it.
+    guess : dict, optional
+        Start values by the names of the parameters.
+    method : {"least squares", "absolute", "bisquare"}
+        What is made least: the squares of the residuals, their absolute values, or squares without those
+        far off.
+
+    Returns
+    -------
+    Fit
+        With the parameters a, b.
+
+    Raises
+    ------
+    ValueError
+        If x and y differ in length, there are fewer samples than parameters, a sigma is not above 0,
+        bounds cross, or a word is none of its words.
+    QxError
+        If the fit does not come to an end.
+
+    Examples
+    --------
+    >>> import numpy as np, qx
+    >>> x = np.linspace(1, 4, 20)
+    >>> {name: round(value, 6) for name, value in qx.fit.logarithm(x, 3 * np.log(2 * x)).parameters.items()}
+    {'a': 3.0, 'b': 2.0}
+    """
+    x, y, w = _samples("logarithm", x, y, sigma)
+    if np.any(x <= 0):
+        refuse("fit.logarithm", "x", "must be above 0", "ErrNotStrictlyPositive")
+    model = _Model("a ln(b x)", "ab", lambda x, p: p[0] * np.log(p[1] * x),
+                   lambda x, p: np.stack([np.log(p[1] * x), np.full(len(x), p[0] / p[1])], -1))
+    return _bounded("logarithm", lambda y, x, w, start, lower, upper, code: core.logarithm(
+        y, x, w, NATURAL, ITERATIONS, start, lower, upper, code, TOLERANCE)[2:4], model, x, y, w, bounds, guess,
+        method, {})
+
+
+def gaussian(x, y, sigma=None, offset=True, bounds=None, guess=None, method="least squares"):
+    """A peak or dip y = a exp(-((x - m) / s)^2 / 2) + c.
+
+    Parameters
+    ----------
+    x, y : array_like
+        The samples.
+    sigma : float or array_like, optional
+        The standard deviation of each y, up to a factor.
+    offset : bool
+        Whether there is a constant c.
+    bounds : dict, optional
+        By the name of a parameter its lower and upper bound; equal ones fix it.
+    guess : dict, optional
+        Start values by the names of the parameters.
+    method : {"least squares", "absolute", "bisquare"}
+        What is made least: the squares of the residuals, their absolute values, or squares without those
+        far off.
+
+    Returns
+    -------
+    Fit
+        With the parameters a, m, s, c.
+
+    Raises
+    ------
+    ValueError
+        If x and y differ in length, there are fewer samples than parameters, a sigma is not above 0,
+        bounds cross, or a word is none of its words.
+    QxError
+        If the fit does not come to an end.
+
+    Examples
+    --------
+    >>> import numpy as np, qx
+    >>> x = np.linspace(-3, 3, 40)
+    >>> {name: round(value, 6) for name, value in qx.fit.gaussian(x, 2 * np.exp(-0.5 * (x - 1)**2 / 0.25) + 1).parameters.items()}
+    {'a': 2.0, 'm': 1.0, 's': 0.5, 'c': 1.0}
+    """
+    x, y, w = _samples("gaussian", x, y, sigma)
+
+    def bell(x, p):
+        return np.exp(-0.5 * ((x - p[1]) / p[2])**2)
+
+    model, fixed = _with_offset(
+        offset, "a exp(-((x - m) / s)^2 / 2)", ["a", "m", "s"], lambda x, p: p[0] * bell(x, p),
+        lambda x, p: [bell(x, p), p[0] * bell(x, p) * (x - p[1]) / p[2]**2,
+                      p[0] * bell(x, p) * (x - p[1])**2 / p[2]**3])
+    return _bounded("gaussian", lambda y, x, w, start, lower, upper, code: core.gaussian(
+        y, x, w, TOLERANCE, ITERATIONS, start, lower, upper, code)[2:6], model, x, y, w, bounds, guess, method, fixed)
+
+
+def linear(H, y, sigma=None, names=None):
+    """A model that is linear in its parameters, y = H c.
+
+    Parameters
+    ----------
+    H : array_like
+        A row for each sample, a column for each parameter.
+    y : array_like
+        The samples.
+    sigma : float or array_like, optional
+        The standard deviation of each y, up to a factor.
+    names : sequence of str, optional
+        Names of the parameters; c0, c1, ... by default.
+
+    Returns
+    -------
+    Fit
+        `predict` and the bands take further rows.
+
+    Raises
+    ------
+    ValueError
+        If x and y differ in length, there are fewer samples than parameters, a sigma is not above 0,
+        bounds cross, or a word is none of its words.
+    QxError
+        If the fit does not come to an end.
+
+    Examples
+    --------
+    >>> import qx
+    >>> round(qx.fit.linear([[1.0, 0.0], [1.0, 1.0], [1.0, 2.0]], [1.0, 3.0, 5.0]).parameters['c1'], 9)
+    2.0
+    """
+    H = np.asarray(H, float)
+    if H.ndim != 2:
+        refuse("fit.linear", "H", f"two dimensions are needed; {H.ndim} came", "ErrSizesDisagree")
+    names = [f"c{j}" for j in range(H.shape[1])] if names is None else list(names)
+    if len(names) != H.shape[1]:
+        refuse("fit.linear", "names", f"{H.shape[1]} are needed; {len(names)} came", "ErrSizesDisagree")
+    _, y, w = _samples("linear", np.zeros(len(H)), y, sigma)
+    p = core.linear(H, y, w, 0, 0)[0]
+    return _finished(_Rows(names), H, y, w, p)
+
+
+class _Rows(_Model):
+    """y = H c, whose x are rows."""
+
+    def __init__(self, names):
+        super().__init__("H c", names, lambda H, p: np.asarray(H, float) @ p, lambda H, p: np.asarray(H, float))
+
+
+def curve(f, x, y, guess, sigma=None, bounds=None, absolute_sigma=False):
+    """Any model, by Levenberg-Marquardt steps with derivatives from differences (D. W. Marquardt, "An
+    algorithm for least-squares estimation of nonlinear parameters", 1963).
+
+    Parameters
+    ----------
+    f : callable
+        f(x, a, b, ...): the model; the names of its arguments are those of the parameters.
+    x, y : array_like
+        The samples.
+    guess : dict or sequence
+        Start values, by name or in the order of the arguments.
+    sigma : float or array_like, optional
+        The standard deviation of each y, up to a factor.
+    bounds : dict, optional
+        By the name of a parameter its lower and upper bound; equal ones fix it.
+    absolute_sigma : bool
+        Whether sigma are the standard deviations themselves: the covariance then does not take the
+        scatter of the residuals.
+
+    Returns
+    -------
+    Fit
+
+    Raises
+    ------
+    ValueError
+        If x and y differ in length, there are fewer samples than parameters, a sigma is not above 0,
+        bounds cross, or a word is none of its words.
+    QxError
+        If the fit does not come to an end.
+
+    Examples
+    --------
+    >>> import numpy as np, qx
+    >>> x = np.linspace(0, 1, 30)
+    >>> fit = qx.fit.curve(lambda x, amplitude, rate: amplitude * np.exp(-rate * x), x, 2 * np.exp(-3 * x), [1, 1])
+    >>> {name: round(value, 6) for name, value in fit.parameters.items()}
+    {'amplitude': 2.0, 'rate': 3.0}
+    """
+    names = [*inspect.signature(f).parameters][1:]
+    given = guess if isinstance(guess, dict) else [*guess]
+    start = given if isinstance(given, dict) else dict(zip(names, given))
+    if len(given) != len(names) or set(start) != set(names):
+        refuse("fit.curve", "guess", f"values for {', '.join(names)} are needed; {guess!r} came", "ErrFitStartValues")
+    x, y, w = _samples("curve", x, y, sigma)
+    if len(x) < len(names):
+        refuse("fit.curve", "x", f"at least {len(names)} samples are needed; {len(x)} came", "ErrFitPointsTooFew")
+    model = _Model(f"{getattr(f, '__name__', 'f')}(x, {', '.join(names)})", names,
+                   lambda x, p: np.asarray(f(x, *p), float) + np.zeros(np.shape(x)))
+    lower, upper, p = _limits("curve", names, bounds, start, {})
+    lower, upper = np.array(lower), np.array(upper)
+    p = _marquardt(model, x, y, w, np.clip(p, lower, upper), lower, upper)
+    return _finished(model, x, y, w, p, lower == upper, absolute_sigma)
+
+
+def _marquardt(model, x, y, w, p, lower, upper):
+    """The parameters with the least weighted squares between the bounds."""
+    def cost_of(p):
+        residuals = y - model.value(x, p)
+        return residuals, float(np.sum(residuals**2 if not len(w) else w * residuals**2))
+
+    residuals, cost = cost_of(p)
+    if not np.isfinite(cost):
+        refuse("fit.curve", "guess", "the model is not finite there", "ErrNaNInData")
+    damping = 1e-3
+    for _ in range(ITERATIONS):
+        rows = model.jacobian(x, p)
+        gradient = rows.T @ (residuals if not len(w) else w * residuals)
+        free = (lower < upper) & ~((p <= lower) & (gradient < 0)) & ~((p >= upper) & (gradient > 0))
+        if not free.any() or cost == 0:
+            return p
+        rows = rows[:, free]
+        matrix = np.ascontiguousarray(rows.T @ (rows if not len(w) else w[:, None] * rows))
+        while True:
+            trial = p.copy()
+            try:
+                trial[free] = core.curve(p[free], matrix, np.ascontiguousarray(gradient[free]), damping)
+            except np.linalg.LinAlgError:
+                refuse("fit.curve", "f", "does not depend on each parameter at " + ", ".join(
+                    f"{name} {one:.6g}" for name, one in zip(model.names, p)), "ErrSingularMatrix")
+            trial = np.clip(trial, lower, upper)
+            with np.errstate(all="ignore"):
+                new_residuals, new_cost = cost_of(trial)
+            if new_cost < cost:
+                break
+            damping *= 10
+            if damping > 1e12:
+                return p
+        is_done = cost - new_cost <= 1e-14 * cost and np.all(np.abs(trial - p) <= 1e-9 * (np.abs(p) + 1e-300))
+        p, residuals, cost, damping = trial, new_residuals, new_cost, max(damping / 10, 1e-15)
+        if is_done:
+            return p
+    warn(QxWarning("qx.fit.curve", 20010, f"qx.fit.curve: not at rest after {ITERATIONS} steps"))
+    return p
+
+
+class SmoothingSpline:
+    r"""The natural cubic spline that is near the samples and smooth.
+
+    It has the least sum of :math:`((y - s(x)) / \sigma)^2 + \lambda \int s''^2`, with lambda by
+    generalised cross validation where nothing is said. C. H. Reinsch, "Smoothing by spline functions",
+    1967; P. Craven, G. Wahba, "Smoothing noisy data with spline functions", 1979.
+
+    Parameters
+    ----------
+    x, y : array_like
+        The samples; x rises.
+    sigma : float or array_like, optional
+        The standard deviation of each y.
+    smoothing : float, optional
+        lambda: 0 goes through all samples.
+    residual : float, optional
+        Instead of lambda, the sum of squared (y - s) / sigma that the smoothest spline may have.
+
+    Attributes
+    ----------
+    x, values : ndarray
+        Where the samples are, and the spline there.
+    smoothing : float
+        lambda.
+    effective_parameters : float
+        How many parameters the spline is worth.
+
+    Raises
+    ------
+    ValueError
+        If x and y differ in length, x does not rise, or a sigma is not above 0.
+
+    Examples
+    --------
+    >>> import numpy as np, qx
+    >>> x = np.linspace(0, 6, 60)
+    >>> spline = qx.fit.SmoothingSpline(x, np.sin(x) + qx.noise.gaussian(60, 0.1, seed=5))
+    >>> bool(abs(spline(3.0) - np.sin(3.0)) < 0.1)
+    True
+    """
+
+    def __init__(self, x, y, sigma=None, smoothing=None, residual=None):
+        if smoothing is not None and residual is not None:
+            refuse("fit.SmoothingSpline", "smoothing, residual", "one of both is given")
+        x, y, w = _samples("SmoothingSpline", x, y, sigma)
+        method, parameter = (1, float(smoothing)) if smoothing is not None else \
+            (2, float(residual)) if residual is not None else (0, 0.0)
+        self.x = x
+        self.values, self.coefficients, _, self.smoothing, self.effective_parameters = core.SmoothingSpline(
+            x, y, 1 / np.sqrt(w) if len(w) else EMPTY, method, parameter)
+
+    def __call__(self, xi, derivative=0):
+        """The spline, or a derivative from 0 to 3, at xi; beyond the samples it is a line."""
+        xi = np.asarray(xi, float)
+        if len(self.x) == 1:
+            return (np.full(xi.shape, self.values[0]) if not derivative else np.zeros(xi.shape))[()]
+        i = np.clip(np.searchsorted(self.x, xi, "right") - 1, 0, len(self.x) - 2)
+        inside = np.clip(xi, self.x[0], self.x[-1])
+        t, c = inside - self.x[i], self.coefficients[i]
+        c0, c1, c2, c3 = np.moveaxis(c, -1, 0)
+        value, slope = c0 + t * (c1 + t * (c2 + t * c3)), c1 + t * (2 * c2 + t * 3 * c3)
+        is_beyond = xi != inside
+        found = (value + slope * (xi - inside), slope, np.where(is_beyond, 0, 2 * c2 + 6 * c3 * t),
+                 np.where(is_beyond, 0, 6 * c3))
+        return found[derivative][()]
+
+    def __repr__(self):
+        return (f"SmoothingSpline: {len(self.x)} samples, lambda {self.smoothing:.6g}, "
+                f"{self.effective_parameters:.4g} effective parameters")
+
+
+class BSpline:
+    """The spline of a degree and with few knots that fits the samples best by least squares.
+
+    Parameters
+    ----------
+    x, y : array_like
+        The samples; x does not fall.
+    knots : int or array_like
+        How many interior knots, at quantiles of x; or where they are.
+    degree : int
+        From 1 to 9.
+    sigma : float or array_like, optional
+        The standard deviation of each y.
+
+    Attributes
+    ----------
+    knots, coefficients : ndarray
+        Of the B-splines (C. de Boor, "A Practical Guide to Splines", 1978).
+    values : ndarray
+        The spline at the samples.
+    mse : float
+        The mean of the weighted squared residuals.
+
+    Raises
+    ------
+    ValueError
+        If x and y differ in length, x falls, degree is not from 1 to 9, or there are too many knots.
+
+    Examples
+    --------
+    >>> import numpy as np, qx
+    >>> x = np.linspace(0, 1, 30)
+    >>> spline = qx.fit.BSpline(x, x**3, 2)
+    >>> round(spline(0.5), 9)
+    0.125
+    """
+
+    def __init__(self, x, y, knots=4, degree=3, sigma=None):
+        x, y, w = _samples("BSpline", x, y, sigma)
+        interior, places = (whole_number("fit.BSpline", "knots", knots, 0, "ErrNegativeCount"), EMPTY) \
+            if np.ndim(knots) == 0 else (0, vector(knots, "fit.BSpline", "knots"))
+        self.degree = whole_number("fit.BSpline", "degree", degree, 1, "ErrOrderNotPositive")
+        self.knots, self.coefficients, self.values, self.mse = core.BSpline(
+            x, y, w, self.degree, interior, places)
+
+    def __call__(self, xi):
+        """The spline at xi, by de Boor's recurrence; beyond the samples the end pieces go on."""
+        xi = np.asarray(xi, float)
+        k, t = self.degree, self.knots
+        i = np.clip(np.searchsorted(t, xi, "right") - 1, k, len(t) - k - 2)
+        d = [self.coefficients[i - k + j] for j in range(k + 1)]
+        for r in range(1, k + 1):
+            for j in range(k, r - 1, -1):
+                low, high = t[i - k + j], t[i + 1 + j - r]
+                a = (xi - low) / (high - low)
+                d[j] = (1 - a) * d[j - 1] + a * d[j]
+        return d[k][()]
+
+    def __repr__(self):
+        return f"BSpline: degree {self.degree}, {len(self.coefficients)} coefficients, mse {self.mse:.6g}"

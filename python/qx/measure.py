@@ -1,0 +1,976 @@
+"""Measurements on signals: peaks, levels, pulses and transitions, tones and harmonics, triggers, delays,
+sound levels and octave bands.
+
+Times and places are in seconds from the first sample where the sampling rate `fs` is given in Hz; with its
+default 1.0 they are in samples.
+"""
+
+import math
+
+import numpy as np
+
+from . import measuring, windows
+from .topical import (LAST, Result, Stream, along, chosen, refuse, result, served, vector,
+                      whole_number)
+
+__all__ = ["Bands", "Harmonics", "Levels", "PeakFinder", "Peaks", "Pulse", "Tone", "Tones", "Trigger",
+           "Triggers", "band_frequencies", "delay", "harmonics", "levels", "octave_bands",
+           "peaks", "pulses", "sound_level", "tone", "tones", "trigger", "weighting",
+           "weighting_filter"]
+
+core = served("measure")
+
+EMPTY = np.empty(0)
+POLARITIES = {"rising": 1, "falling": 0}
+SLOPES = {"rising": 0, "falling": 1, "either": 2}
+LEVELS = {"histogram": 0, "peak": 1, "auto": 2}
+
+
+@result
+class Peaks(Result):
+    """Peaks, in the order of time; unpacked, positions and heights.
+
+    Attributes
+    ----------
+    positions : ndarray
+        Their times, between samples by the parabola through the nearest ones.
+    heights : ndarray
+        The values of these parabolas there.
+    prominences : ndarray
+        How far each stands out of what is around it, up to the next higher one.
+    widths : ndarray
+        In time, half way down the prominence.
+    indices : ndarray of int
+        The samples that are higher than their neighbours; of a plateau its middle.
+    """
+
+    positions: np.ndarray
+    heights: np.ndarray
+    prominences: np.ndarray
+    widths: np.ndarray
+    indices: np.ndarray
+    _unpacked = ("positions", "heights")
+
+    def __len__(self):
+        return len(self.positions)
+
+
+@result
+class Tone(Result):
+    """A tone, amplitude cos(2 pi frequency t + phase) + offset.
+
+    Attributes
+    ----------
+    frequency, amplitude, phase, offset : float
+        In the unit of fs, of the peak, in radians at the first sample, and the constant.
+    residual : float
+        The root mean square of what is left.
+    """
+
+    frequency: float
+    amplitude: float
+    phase: float
+    offset: float
+    residual: float
+
+
+@result
+class Tones(Result):
+    """Several tones; unpacked, frequencies and amplitudes.
+
+    Attributes
+    ----------
+    frequencies, amplitudes, phases : ndarray
+        In the unit of fs, of the peaks, and in radians at the first sample.
+    residual : float
+        The root mean square of what is left.
+    """
+
+    frequencies: np.ndarray
+    amplitudes: np.ndarray
+    phases: np.ndarray
+    residual: float
+    _unpacked = ("frequencies", "amplitudes")
+
+
+@result
+class Harmonics(Result):
+    """A tone and its harmonics, by the definitions of IEEE Std 1241-2010.
+
+    Attributes
+    ----------
+    frequencies, amplitudes, phases : ndarray
+        Of the fundamental and the harmonics; NaN where one cannot be told from others.
+    thd : float
+        The total harmonic distortion, a ratio of amplitudes.
+    sinad, snr, sfdr : float
+        In dB.
+    enob : float
+        Effective bits.
+    noise_floor : float
+        The noise in a bin of the spectrum, in dB of the fundamental.
+    """
+
+    frequencies: np.ndarray
+    amplitudes: np.ndarray
+    phases: np.ndarray
+    thd: float
+    sinad: float
+    snr: float
+    sfdr: float
+    enob: float
+    noise_floor: float
+
+
+@result
+class Levels(Result):
+    """The two states of a waveform; unpacked, high, low and amplitude.
+
+    Attributes
+    ----------
+    high, low, amplitude : float
+        The levels of the states and their difference.
+    """
+
+    high: float
+    low: float
+    amplitude: float
+
+
+@result
+class Pulse(Result):
+    """A pulse, by the terms of IEEE Std 181.
+
+    Attributes
+    ----------
+    start, middle, width : float
+        Time of the first edge's crossing of the mid reference, of the pulse's middle, and the width there.
+    high, low : float
+        The levels of the states.
+    rise, fall : float
+        The durations of the edges between the low and the high reference.
+    slew_rate : float
+        Of the first edge, in units of the signal by time.
+    overshoot_first, overshoot_second : float
+        Behind each edge, in per cent of the amplitude, in its direction.
+    """
+
+    start: float
+    middle: float
+    width: float
+    high: float
+    low: float
+    rise: float
+    fall: float
+    slew_rate: float
+    overshoot_first: float
+    overshoot_second: float
+
+
+@result
+class Triggers(Result):
+    """Where a signal passes a level.
+
+    Attributes
+    ----------
+    positions : ndarray
+        Times, between samples by the line from one to the next.
+    indices : ndarray of int
+        The samples that trigger.
+    """
+
+    positions: np.ndarray
+    indices: np.ndarray
+
+    def __len__(self):
+        return len(self.positions)
+
+
+@result
+class Bands(Result):
+    """Levels in bands; unpacked, midband frequencies and levels.
+
+    Attributes
+    ----------
+    frequencies : ndarray
+        The exact midband frequencies, in the unit of fs.
+    levels : ndarray
+        In dB of the square of the reference.
+    edges : ndarray
+        The lower and the upper edge of each band.
+    """
+
+    frequencies: np.ndarray
+    levels: np.ndarray
+    edges: np.ndarray
+    _unpacked = ("frequencies", "levels")
+
+    def plot(self, axes=None):
+        """Draws the levels as bars with matplotlib; returns the axes."""
+        if axes is None:
+            from matplotlib import pyplot
+            axes = pyplot.subplots()[1]
+        axes.bar(range(len(self.frequencies)), self.levels)
+        axes.set_xticks(range(len(self.frequencies)), [f"{one:.3g}" for one in self.frequencies], rotation=90)
+        axes.set(xlabel="band", ylabel="level (dB)")
+        return axes
+
+
+def _rate(function, fs):
+    if not fs > 0:
+        refuse(f"measure.{function}", "fs", f"must be above 0; {fs} came", "ErrSamplingNotPositive")
+    return float(fs)
+
+
+def peaks(x, fs=1.0, height=None, prominence=None, distance=None, valleys=False):
+    """The peaks of a signal, or its valleys.
+
+    Parameters
+    ----------
+    x : array_like
+        Real samples, of one dimension.
+    fs : float
+        The sampling rate.
+    height : float, optional
+        Peaks are higher than this, valleys lower.
+    prominence : float, optional
+        Peaks stand out at least as far. Without a height or a prominence those count that stand out from
+        the noise: two fifths of the third most prominent, and at least a fifth of the most prominent.
+    distance : float, optional
+        Of peaks nearer than this, in time, the less prominent ones go.
+    valleys : bool
+        Look for valleys.
+
+    Returns
+    -------
+    Peaks
+
+    Raises
+    ------
+    ValueError
+        If x has another number of dimensions than one, or fs is not above 0.
+
+    Examples
+    --------
+    >>> import numpy as np, qx
+    >>> x = np.cos(2 * np.pi * 5.3 * np.arange(1000) / 1000)
+    >>> qx.measure.peaks(x, 1000).positions.round(4)
+    array([0.1887, 0.3774, 0.566 , 0.7547, 0.9434])
+    """
+    x, fs = vector(x, "measure.peaks", "x").astype(float), _rate("peaks", fs)
+    sign = -1.0 if valleys else 1.0
+    values = sign * x
+    at = measuring.local_maxima(values) if len(x) > 2 else np.zeros(0, int)
+    stand = measuring.prominences(values, at)
+    if prominence is None and height is None:
+        prominence = measuring.outstanding(stand)
+    kept = np.ones(len(at), bool)
+    if height is not None:
+        kept &= values[at] > sign * height
+    if prominence is not None:
+        kept &= stand >= max(prominence, 64 * np.finfo(float).eps * np.abs(x).max(initial=0))
+    at, stand = at[kept], stand[kept]
+    if distance is not None and len(at):
+        chosen_ones = set(measuring.separated(at, stand, distance * fs).tolist())
+        kept = np.array([one in chosen_ones for one in at.tolist()])
+        at, stand = at[kept], stand[kept]
+    positions, heights = _vertices(values, at)
+    return Peaks(positions / fs, sign * heights, stand, _widths(values, at, stand) / fs, at)
+
+
+def _vertices(values, at):
+    """The parabolas through each sample and its neighbours; of a plateau the sample itself."""
+    before, here, behind = values[at - 1], values[at], values[at + 1]
+    bend = before - 2 * here + behind
+    is_sharp = (bend < 0) & (here >= before) & (here >= behind)
+    shift = np.divide(before - behind, 2 * bend, out=np.zeros(len(at)), where=is_sharp)
+    return at + shift, here + (behind - before) * shift / 4
+
+
+def _widths(values, at, stand):
+    """The widths half way down the prominences, in samples, between samples by straight lines."""
+    found = np.zeros(len(at))
+    for i, (place, prominence) in enumerate(zip(at.tolist(), stand.tolist())):
+        level = values[place] - prominence / 2
+        left = right = place
+        while left > 0 and values[left] > level:
+            left -= 1
+        while right < len(values) - 1 and values[right] > level:
+            right += 1
+        start = left + ((level - values[left]) / (values[left + 1] - values[left])
+                        if values[left] < level else 0)
+        end = right - ((level - values[right]) / (values[right - 1] - values[right])
+                       if values[right] < level else 0)
+        found[i] = end - start
+    return found
+
+
+class PeakFinder(Stream):
+    """Peaks above a threshold, or valleys below it, in a stream: each block returns the places and heights
+    that it has made certain. A parabola is fitted to every window of `width` samples; a place counts from
+    the start of the stream.
+
+    Parameters
+    ----------
+    threshold : float
+        Peaks are higher, valleys lower.
+    width : int
+        The samples of a window, at least 3.
+    fs : float
+        The sampling rate.
+    valleys : bool
+        Look for valleys.
+
+    Examples
+    --------
+    >>> import qx
+    >>> finder = qx.measure.PeakFinder(0.5, width=5)
+    >>> found = finder(qx.signals.sine(100, 0.02)), finder.finish()
+    >>> sum(len(part) for part in found)
+    2
+    """
+
+    dtypes = (np.dtype(float),)
+
+    def __init__(self, threshold, width=5, fs=1.0, valleys=False):
+        self.threshold, self.valleys = float(threshold), bool(valleys)
+        self.width = whole_number("measure.PeakFinder", "width", width, 3, "ErrInvalidSelector")
+        self.fs = _rate("PeakFinder", fs)
+        super().__init__()
+
+    def _start(self):
+        """What is too short for a call, the export's state and buffer, and whether it has begun."""
+        return np.empty(0), {}, np.empty(0), False
+
+    def _run(self, state, block, is_last):
+        _, place, buffer, has_begun = state
+        request = {"data": block, "threshold": self.threshold, "width": self.width,
+                   "polarity": int(self.valleys), "flags": (not has_begun) + 4 * is_last}
+        found, place, buffer = core.PeakFinder(request, place, buffer)
+        return Triggers(found["locations"] / self.fs, np.floor(found["locations"]).astype(int)), (
+            np.empty(0), place, buffer, True)
+
+    def _step(self, state, block):
+        block = np.concatenate([state[0], block])
+        if len(block) < 2 * self.width:
+            return _no_triggers(), (block, *state[1:])
+        # The rest stays in hand, so that a last block is long enough.
+        found, state = self._run(state, block[:-self.width], False)
+        return found, (block[-self.width:], *state[1:])
+
+    def __call__(self, block):
+        found = super().__call__(block)
+        return found if isinstance(found, Triggers) else _no_triggers()
+
+    def finish(self):
+        """The peaks of the last window; begins anew."""
+        state = self._states[0]
+        self.reset()
+        if len(state[0]) < self.width:
+            return _no_triggers()
+        return self._run(state, state[0], True)[0]
+
+
+def _no_triggers():
+    return Triggers(np.empty(0), np.empty(0, int))
+
+
+def levels(x, method="auto", bins=256):
+    """The levels of the two states of a waveform.
+
+    Parameters
+    ----------
+    x : array_like
+        Real samples, of one dimension.
+    method : {"auto", "histogram", "peak"}
+        The modes of the histogram, the extremes, or whichever fits.
+    bins : int
+        Of the histogram.
+
+    Returns
+    -------
+    Levels
+
+    Raises
+    ------
+    QxError
+        If there are no two states.
+    ValueError
+        If x is empty, or method is none of its words.
+
+    Examples
+    --------
+    >>> import qx
+    >>> [round(one, 2) for one in qx.measure.levels(qx.signals.square(1000, 0.01) + 1)]
+    [2.0, 0.0, 1.99]
+    """
+    code = chosen("measure.levels", "method", method, LEVELS)
+    bins = whole_number("measure.levels", "bins", bins, 1, "ErrMeasureEmptyChannel")
+    return Levels(*core.levels(vector(x, "measure.levels", "x"), 0.0, 1.0, code, bins, 0))
+
+
+def pulses(x, fs=1.0, first="rising"):
+    """The pulses of a waveform, up to 1000.
+
+    Parameters
+    ----------
+    x : array_like
+        Real samples, of one dimension.
+    fs : float
+        The sampling rate.
+    first : {"rising", "falling"}
+        The edge that a pulse begins with.
+
+    Returns
+    -------
+    list of Pulse
+
+    Raises
+    ------
+    ValueError
+        If x has another number of dimensions than one, or first is none of its words.
+
+    Examples
+    --------
+    >>> import numpy as np, qx
+    >>> x = np.interp(np.arange(100), [20, 30, 60, 70], [0.0, 1.0, 1.0, 0.0])
+    >>> found, = qx.measure.pulses(x, fs=10)
+    >>> round(found.width, 3), round(found.rise, 3)
+    (4.0, 0.792)
+    """
+    x, fs = vector(x, "measure.pulses", "x").astype(float), _rate("pulses", fs)
+    direction = chosen("measure.pulses", "first", first, POLARITIES)
+    return [Pulse((one.middle - one.width / 2) / fs, one.middle / fs, one.width / fs, one.high, one.low,
+                  *((one.first_duration / fs, one.second_duration / fs)[::1 if one.rises else -1]),
+                  one.slew_rate * fs, one.first_overshoot, one.second_overshoot)
+            for one in measuring.pulses(x, direction)]
+
+
+def tone(x, fs=1.0, near=None, within=None):
+    """The largest tone, or the largest near a frequency, fitted by least squares (IEEE Std 1057).
+
+    Parameters
+    ----------
+    x : array_like
+        Real samples, of one dimension.
+    fs : float
+        The sampling rate.
+    near : float, optional
+        About where it is, in the unit of fs.
+    within : float, optional
+        How far from there it may be; 2 bins by default.
+
+    Returns
+    -------
+    Tone
+
+    Raises
+    ------
+    QxError
+        If there is no tone.
+    ValueError
+        If there are fewer than 4 samples, or one is not finite.
+
+    Examples
+    --------
+    >>> import qx
+    >>> found = qx.measure.tone(qx.signals.sine(1000, 50.2, fs=1000), fs=1000)
+    >>> round(found.frequency, 6), round(found.amplitude, 6)
+    (50.2, 1.0)
+    """
+    x, fs = vector(x, "measure.tone", "x"), _rate("tone", fs)
+    half = 0.0 if near is None else 2 * fs / max(len(x), 1) if within is None else float(within)
+    return Tone(*core.tone(x, 1 / fs, 0.0 if near is None else float(near), half))
+
+
+def tones(x, fs=1.0, count=5, order="amplitude"):
+    """The largest tones, fitted together by least squares; fewer where the rest could be noise.
+
+    Parameters
+    ----------
+    x : array_like
+        Real samples, of one dimension.
+    fs : float
+        The sampling rate.
+    count : int
+        How many at most.
+    order : {"amplitude", "frequency"}
+        Falling amplitudes or rising frequencies.
+
+    Returns
+    -------
+    Tones
+
+    Raises
+    ------
+    QxError
+        If there is no tone.
+    ValueError
+        If there are fewer than 4 samples, one is not finite, or order is none of its words.
+
+    Examples
+    --------
+    >>> import qx
+    >>> x = qx.signals.sine(1000, 50.2, 1000) + 0.1 * qx.signals.sine(1000, 120, 1000)
+    >>> qx.measure.tones(x, 1000).frequencies.round(6)
+    array([ 50.2, 120. ])
+    """
+    code = chosen("measure.tones", "order", order, {"amplitude": 0, "frequency": 1})
+    count = whole_number("measure.tones", "count", count, 1, "ErrMeasureBadCount")
+    return Tones(*core.tones(vector(x, "measure.tones", "x"), 1 / _rate("tones", fs), count, code))
+
+
+def harmonics(x, fs=1.0, fundamental=None, count=10, full_scale=None):
+    """A tone, its harmonics, and the distortion and noise beside it.
+
+    Parameters
+    ----------
+    x : array_like
+        Real samples, of one dimension.
+    fs : float
+        The sampling rate.
+    fundamental : float, optional
+        About where the tone is, in the unit of fs; the largest by default.
+    count : int
+        Harmonics up to this multiple, or as many as the samples can tell.
+    full_scale : float, optional
+        The amplitude to which effective bits refer; that of the tone by default.
+
+    Returns
+    -------
+    Harmonics
+
+    Raises
+    ------
+    QxError
+        If there is no tone.
+    ValueError
+        If there are fewer than 4 samples, or one is not finite.
+
+    Examples
+    --------
+    >>> import qx
+    >>> x = qx.signals.sine(1000, 50.2, 1000) + 0.01 * qx.signals.sine(1000, 100.4, 1000)
+    >>> round(qx.measure.harmonics(x, 1000).thd, 9)
+    0.01
+    """
+    x = vector(x, "measure.harmonics", "x")
+    count = min(whole_number("measure.harmonics", "count", count, 1, "ErrMeasureBadCount"), max(1, len(x) // 2 - 1))
+    return Harmonics(*core.harmonics(x, 1 / _rate("harmonics", fs), float(fundamental or 0), count,
+                                     float(full_scale or 0)))
+
+
+def trigger(x, level, fs=1.0, slope="rising", hysteresis=0.0, holdoff=0.0):
+    """All places where a signal passes a level.
+
+    Parameters
+    ----------
+    x : array_like
+        Real samples, of one dimension.
+    level : float
+        The level.
+    fs : float
+        The sampling rate.
+    slope : {"rising", "falling", "either"}
+        In which direction.
+    hysteresis : float
+        How far beyond the level the signal must have been before.
+    holdoff : float
+        The time after a trigger in which none follows.
+
+    Returns
+    -------
+    Triggers
+
+    Raises
+    ------
+    ValueError
+        If a sample is not finite, hysteresis or holdoff is negative, or slope is none of its words.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.measure.trigger(qx.signals.sine(100, 0.04), 0.5).positions.round(2)
+    array([ 2.09, 27.09, 52.09, 77.09])
+    """
+    return Trigger(level, fs, slope, hysteresis, holdoff)(vector(x, "measure.trigger", "x").astype(float))
+
+
+class Trigger(Stream):
+    """The stream of `trigger`: each block returns its Triggers, with places and indices from the start of
+    the stream.
+
+    Parameters
+    ----------
+    level : float
+        The level.
+    fs : float
+        The sampling rate.
+    slope : {"rising", "falling", "either"}
+        In which direction.
+    hysteresis : float
+        How far beyond the level the signal must have been before.
+    holdoff : float
+        The time after a trigger in which none follows.
+
+    Examples
+    --------
+    >>> import qx
+    >>> stream, x = qx.measure.Trigger(0.5), qx.signals.sine(100, 0.04)
+    >>> len(stream(x[:60])), len(stream(x[60:]))
+    (3, 1)
+    """
+
+    dtypes = (np.dtype(float),)
+
+    def __init__(self, level, fs=1.0, slope="rising", hysteresis=0.0, holdoff=0.0):
+        self.slope = chosen("measure.trigger", "slope", slope, SLOPES)
+        self.level, self.hysteresis, self.fs = float(level), float(hysteresis), _rate("trigger", fs)
+        if not hysteresis >= 0 or not holdoff >= 0:
+            refuse("measure.trigger", "hysteresis, holdoff", "must not be negative", "ErrNegativeSetting")
+        self.holdoff = round(holdoff * self.fs)
+        super().__init__()
+
+    def _start(self):
+        """The export's state, and the samples so far."""
+        return {}, 0
+
+    def _step(self, state, block):
+        place, before = state
+        positions, indices, start = [], [], 0
+        while start <= len(block):
+            place, index, position = core.trigger(block, self.level, self.hysteresis, self.slope, start,
+                                                  self.holdoff, place)
+            if index < 0:
+                break
+            positions.append(before + position)
+            indices.append(before + index)
+            start = index + 1
+        return Triggers(np.array(positions) / self.fs, np.array(indices, int)), (place, before + len(block))
+
+    def __call__(self, block):
+        found = super().__call__(block)
+        return found if isinstance(found, Triggers) else _no_triggers()
+
+    def finish(self):
+        """Nothing is left to come; begins anew."""
+        self.reset()
+        return _no_triggers()
+
+
+def delay(x, y, fs=1.0, most=None):
+    """By how much y is later than x: the place of the peak of their cross-correlation, between samples
+    by the correlation's own Fourier series, which is exact where the spectra end below fs / 2.
+
+    Parameters
+    ----------
+    x, y : array_like
+        Two real signals.
+    fs : float
+        The sampling rate.
+    most : float, optional
+        The largest delay in either direction, in time.
+
+    Returns
+    -------
+    float
+        In time; negative where y is earlier.
+
+    Raises
+    ------
+    ValueError
+        If an array is empty or fs is not above 0.
+    QxError
+        If there is no correlation.
+
+    Examples
+    --------
+    >>> import qx
+    >>> x = qx.filters.butterworth(4, 0.1)(qx.noise.gaussian(2000, seed=3))
+    >>> round(qx.measure.delay(x[100:1100], x[93:1093]), 9)
+    7.0
+    """
+    fs = _rate("delay", fs)
+    x, y = (vector(one, "measure.delay", name).astype(float) for one, name in ((x, "x"), (y, "y")))
+    if not len(x) or not len(y):
+        refuse("measure.delay", "x, y", "an array is empty", "ErrEmptyInput")
+    x, y = x - x.mean(), y - y.mean()
+    full = core.delay(x, y, 1, 0)  # lag 0 is at the last place of x
+    lags = np.arange(len(full)) - (len(x) - 1)
+    inside = np.abs(lags) <= (math.inf if most is None else most * fs)
+    if not inside.any() or not np.any(full[inside]):
+        refuse("measure.delay", "x, y", "have no correlation, or no lag is allowed", "ErrMeasureNotFound")
+    best = int(lags[inside][np.argmax(full[inside])])
+    return _refined(x, y, best) / fs
+
+
+def _refined(x, y, lag):
+    """The maximum of the correlation's Fourier series near a lag, by Newton's method. Only what both have
+    is correlated, under a Hann window, so that the ends do not pull."""
+    first, last = max(0, -lag), min(len(x), len(y) - lag)
+    window = windows.hann(last - first + 2)[1:-1]
+    x, y = ((part - np.average(part, weights=window)) * window
+            for part in (x[first:last], y[first + lag:last + lag]))
+    n = 2 * len(x)
+    half = n // 2 + 1
+    cross = np.conj(core.delay_spectrum(x, 0, n, 0)[:half]) * core.delay_spectrum(y, 0, n, 0)[:half]
+    w = 2 * np.pi * np.arange(half) / n
+    at = 0.0
+    for _ in range(50):
+        turned = cross * np.exp(1j * w * at)
+        slope, bend = -np.sum(w * turned.imag), -np.sum(w * w * turned.real)
+        if not bend < 0:
+            return float(lag)
+        step = -slope / bend
+        at += max(-0.5, min(0.5, step))
+        if abs(step) < 1e-12:
+            break
+    return lag + (at if abs(at) <= 1 else 0.0)
+
+
+# Sound levels. The constants of the frequency weightings are those of IEC 61672-1, annex E, in Hz.
+
+WEIGHTINGS = {"A": "A", "C": "C", "Z": "Z"}
+_F1, _F2, _F3, _F4 = 20.598997, 107.65265, 737.86223, 12194.217
+_BAND_RATIO = 10 ** 0.3  # an octave, by IEC 61260-1
+
+
+def weighting(frequencies, kind="A"):
+    r"""The frequency weighting of IEC 61672-1.
+
+    .. math:: A(f) = 20 \lg \frac{f_4^2 f^4}{(f^2 + f_1^2) \sqrt{(f^2 + f_2^2)(f^2 + f_3^2)} (f^2 + f_4^2)} - A_{1000}
+
+    Parameters
+    ----------
+    frequencies : array_like
+        In Hz.
+    kind : {"A", "C", "Z"}
+        Which one; Z is flat.
+
+    Returns
+    -------
+    float or ndarray
+        In dB, 0 at 1 kHz.
+
+    Raises
+    ------
+    ValueError
+        If kind is none of its words.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.measure.weighting([100.0, 1000.0]).round(1)
+    array([-19.1,   0. ])
+    """
+    kind = chosen("measure.weighting", "kind", kind, WEIGHTINGS)
+    f = np.asarray(frequencies, float)
+
+    def gain(f):
+        f = f * f
+        c = _F4**2 * f / ((f + _F1**2) * (f + _F4**2))
+        return c if kind == "C" else c * f / np.sqrt((f + _F2**2) * (f + _F3**2))
+
+    if kind == "Z":
+        return np.zeros(f.shape)[()]
+    with np.errstate(divide="ignore"):
+        return (20 * np.log10(gain(f) / gain(np.float64(1000.0))))[()]
+
+
+def weighting_filter(fs, kind="A"):
+    """The A or C weighting as a filter: the poles of IEC 61672-1 by the bilinear transform, 0 dB at 1
+    kHz. Within class 1 up to 16 kHz at rates from 48 kHz on.
+
+    Parameters
+    ----------
+    fs : float
+        The sampling rate in Hz, above 2 kHz.
+    kind : {"A", "C"}
+        Which one.
+
+    Returns
+    -------
+    qx.filters.Filter
+
+    Raises
+    ------
+    ValueError
+        If fs is not above 2 kHz, or kind is none of its words.
+
+    Examples
+    --------
+    >>> import qx
+    >>> abs(qx.measure.weighting_filter(48000).response([100.0, 1000.0]).decibels).round(2)
+    array([19.15,  0.  ])
+    """
+    from . import filters
+    kind = chosen("measure.weighting_filter", "kind", kind, {"A": "A", "C": "C"})
+    if not fs > 2000:
+        refuse("measure.weighting_filter", "fs", f"must be above 2000 Hz; {fs} came", "ErrAboveNyquist")
+    w1, w2, w3, w4 = (2 * np.pi * f for f in (_F1, _F2, _F3, _F4))
+    sections = [([1.0, 0.0, 0.0], (w1, w1)), ([0.0, 0.0, w4 * w4], (w4, w4))]
+    if kind == "A":
+        sections.insert(1, ([1.0, 0.0, 0.0], (w2, w3)))
+    rows = []
+    for (s2, s1, s0), (p, q) in sections:
+        k = 2 * fs
+        above = [s2 * k * k + s1 * k + s0, 2 * s0 - 2 * s2 * k * k, s2 * k * k - s1 * k + s0]
+        below = [(k + p) * (k + q), 2 * (p * q - k * k), (k - p) * (k - q)]
+        rows.append([*above, *below])
+    made = filters.from_sos(rows, fs)
+    sos = made.sos
+    sos[0, :3] /= made.response([1000.0]).magnitude[0]
+    found = filters.from_sos(sos, fs)
+    found.title = f"{kind} weighting, fs {fs:g}"
+    return found
+
+
+def sound_level(x, fs, weighting="A", reference=2e-5, axis=LAST):
+    """The equivalent level of a sound pressure.
+
+    Parameters
+    ----------
+    x : array_like
+        Sound pressure in Pa.
+    fs : float
+        The sampling rate in Hz.
+    weighting : {"A", "C", "Z"}
+        The frequency weighting.
+    reference : float
+        The pressure of 0 dB.
+    axis : int
+        The axis of time.
+
+    Returns
+    -------
+    float or ndarray
+        In dB.
+
+    Raises
+    ------
+    ValueError
+        If x is empty, or weighting is none of its words.
+
+    Examples
+    --------
+    >>> import qx
+    >>> round(qx.measure.sound_level(2**0.5 * qx.signals.sine(48000, 1000, 48000), 48000), 1)
+    94.0
+    """
+    kind = chosen("measure.sound_level", "weighting", weighting, WEIGHTINGS)
+    f = None if kind == "Z" else weighting_filter(fs, kind)
+
+    def of_channel(channel):
+        mean_square = core.sound_level(f(channel) if f else channel)**2
+        return 10 * math.log10(mean_square / reference**2) if mean_square else -math.inf
+
+    return along(of_channel, x, axis)
+
+
+def octave_bands(x, fs, fraction=3, low=25.0, high=None, reference=1.0, axis=LAST):
+    """The levels in bands of an octave or a fraction of one, by Butterworth bandpass filters with the
+    midband frequencies and edges of IEC 61260-1. Low bands are filtered at a lower rate.
+
+    Parameters
+    ----------
+    x : array_like
+        Real samples.
+    fs : float
+        The sampling rate in Hz.
+    fraction : int
+        1 for octaves, 3 for third octaves, ...
+    low, high : float, optional
+        The lowest and the highest midband frequency, in Hz; up to 0.45 fs by default.
+    reference : float
+        The value of 0 dB, such as 2e-5 for a sound pressure in Pa.
+    axis : int
+        The axis of time.
+
+    Returns
+    -------
+    Bands
+        With the bands along the axis of time.
+
+    Raises
+    ------
+    ValueError
+        If x is empty, there is no band, or the highest ends above fs / 2.
+
+    Examples
+    --------
+    >>> import qx
+    >>> x = qx.signals.sine(20000, 1000, 20000, 2**0.5)
+    >>> found = qx.measure.octave_bands(x, 20000, 1, 500, 2000)
+    >>> found.levels.round(1), found.frequencies.round(1)
+    (array([-20.1,  -0. , -19.1]), array([ 501.2, 1000. , 1995.3]))
+    """
+    from . import multirate
+    name = "measure.octave_bands"
+    fs = _rate("octave_bands", fs)
+    fraction = whole_number(name, "fraction", fraction, 1)
+    middles = band_frequencies(fraction, low, 0.45 * fs / _BAND_RATIO**(0.5 / fraction) if high is None else high)
+    if not len(middles):
+        refuse(name, "low, high", "there is no band between them", "ErrRangeReversed")
+    half = _BAND_RATIO ** (0.5 / fraction)
+    if middles[-1] * half >= fs / 2:
+        refuse(name, "high", f"the band at {middles[-1]:.5g} ends above half the sampling rate, {fs / 2:g}",
+               "ErrAboveNyquist")
+
+    def of_channel(channel):
+        found, rate = np.empty(len(middles)), fs
+        channel = np.asarray(channel, float)
+        for i in range(len(middles) - 1, -1, -1):
+            while middles[i] * half < 0.05 * rate and len(channel) > 64:
+                channel, rate = multirate.resample(channel, 1, 2), rate / 2
+            passed = _band_filter(middles[i], half, rate)(channel)
+            mean_square = core.sound_level(passed)**2
+            found[i] = 10 * math.log10(mean_square / reference**2) if mean_square else -math.inf
+        return found
+
+    return Bands(middles, along(of_channel, x, axis), np.stack([middles / half, middles * half], -1))
+
+
+def _band_filter(middle, half, rate):
+    from . import filters
+    return filters.butterworth(3, (middle / half, middle * half), "bandpass", rate)
+
+
+def band_frequencies(fraction=3, low=25.0, high=20000.0):
+    r"""The exact midband frequencies of IEC 61260-1 with base 10.
+
+    .. math:: f_k = 1000 \cdot 10^{0.3 k / b}
+
+    Parameters
+    ----------
+    fraction : int
+        1 for octaves, 3 for third octaves, ...
+    low, high : float
+        The lowest and the highest, in Hz; a nominal frequency counts as the exact one next to it.
+
+    Returns
+    -------
+    ndarray of float64
+
+    Raises
+    ------
+    ValueError
+        If fraction is below 1, or the bounds are not above 0 and in order.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.measure.band_frequencies(1, 31.5, 16000).round(2)
+    array([   31.62,    63.1 ,   125.89,   251.19,   501.19,  1000.  ,
+            1995.26,  3981.07,  7943.28, 15848.93])
+    """
+    fraction = whole_number("measure.band_frequencies", "fraction", fraction, 1)
+    if not 0 < low <= high:
+        refuse("measure.band_frequencies", "low, high", "must be above 0 and in order", "ErrRangeReversed")
+    shift = 0.0 if fraction % 2 else 0.5  # even fractions have no band at 1 kHz
+    step = 0.3 / fraction
+
+    def index(f):
+        return math.log10(f / 1000) / step - shift
+
+    first, last = math.ceil(index(low) - 0.25), math.floor(index(high) + 0.25)
+    return 1000 * 10.0 ** (step * (np.arange(first, last + 1) + shift))

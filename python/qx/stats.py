@@ -1,0 +1,721 @@
+"""Statistics of samples, distributions, tables of counts and analyses of variance.
+
+Functions of samples take the last axis, not all values at once as NumPy's do; of a pandas table the
+columns.
+"""
+
+import math
+
+import numpy as np
+
+from .topical import LAST, Result, Stream, along, either, refuse, result, served, whole_number
+from .topical.axes import as_array
+
+__all__ = ["Anova", "Distribution", "Histogram", "Running", "Summary", "Test", "anova", "anova2",
+           "anova3", "chi2", "contingency", "f", "histogram", "kurtosis", "mean", "median",
+           "mode", "moment", "mse", "norm", "rms", "skew", "std", "t", "var"]
+
+core = served("stats")
+
+
+@result
+class Histogram(Result):
+    """Counts of samples in bins; unpacked, counts and edges, as of `numpy.histogram`.
+
+    Attributes
+    ----------
+    counts : ndarray of int32
+        How many samples each bin has.
+    edges : ndarray
+        The edges, one more than bins.
+    centres : ndarray
+        The centres of the bins.
+    """
+
+    counts: np.ndarray
+    edges: np.ndarray
+    centres: np.ndarray
+    _unpacked = ("counts", "edges")
+
+
+@result
+class Test(Result):
+    """A test; unpacked, the statistic and the probability.
+
+    Attributes
+    ----------
+    statistic : float
+        What is compared.
+    p : float
+        The probability of a larger one by chance.
+    dof : tuple
+        The degrees of freedom.
+    """
+
+    statistic: float
+    p: float
+    dof: tuple
+    _unpacked = ("statistic", "p")
+
+
+@result
+class Anova(Result):
+    """An analysis of variance, one row of the table in each array.
+
+    Attributes
+    ----------
+    sources : tuple of str
+        What the rows are.
+    sums : ndarray
+        Sums of squares.
+    dof : ndarray
+        Degrees of freedom.
+    means : ndarray
+        Means of squares.
+    f : ndarray
+        Ratios of variances; NaN where there is none.
+    p : ndarray
+        Probabilities of larger ones by chance.
+    """
+
+    sources: tuple
+    sums: np.ndarray
+    dof: np.ndarray
+    means: np.ndarray
+    f: np.ndarray
+    p: np.ndarray
+
+    def _rows(self):
+        def text(value):
+            return "" if np.isnan(value) else f"{value:.6g}"
+        yield "", "sum", "dof", "mean", "F", "p"
+        for row in zip(self.sources, self.sums, self.dof, self.means, self.f, self.p):
+            yield row[0], *map(text, row[1:])
+
+    def __repr__(self):
+        return "\n".join("Anova" + row[0].rjust(8) + "".join(cell.rjust(13) for cell in row[1:])
+                         if not i else row[0].ljust(13) + "".join(cell.rjust(13) for cell in row[1:])
+                         for i, row in enumerate(self._rows()))
+
+    def _repr_html_(self):
+        rows = "".join("<tr>" + "".join(f"<td>{cell}</td>" for cell in row) + "</tr>" for row in self._rows())
+        return f"<table>{rows}</table>"
+
+
+class Distribution:
+    """A distribution with its cumulative function and its quantiles; made by this module: `norm`, `t`, `chi2`
+    and `f`, with degrees of freedom as whole numbers behind the argument, as of `scipy.stats`.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.stats.chi2.cdf(3.841, 1).round(3)
+    0.95
+    """
+
+    def __init__(self, name, parameters):
+        self.name, self.parameters = name, parameters
+
+    def _call(self, kind, x, dof):
+        if len(dof) != len(self.parameters):
+            refuse(f"stats.{self.name}", ", ".join(self.parameters) or "dof",
+                   f"{len(self.parameters)} are needed; {len(dof)} came", "ErrTooFewForParameters")
+        return np.asarray(getattr(core, f"{self.name}_{kind}")(x, *dof))[()]
+
+    def cdf(self, x, *dof):
+        """The probability of a value of at most x."""
+        return self._call("cdf", x, dof)
+
+    def sf(self, x, *dof):
+        """The probability of a value above x, 1 - cdf."""
+        return 1 - self.cdf(x, *dof)
+
+    def ppf(self, p, *dof):
+        """The quantile: the value that is not exceeded with probability p."""
+        return self._call("ppf", p, dof)
+
+    def __repr__(self):
+        return f"Distribution {self.name}({', '.join(self.parameters)})"
+
+
+norm = Distribution("norm", ())
+t = Distribution("t", ("dof",))
+chi2 = Distribution("chi2", ("dof",))
+f = Distribution("f", ("n", "d"))
+
+
+def mean(x, axis=LAST):
+    """The arithmetic mean.
+
+    Parameters
+    ----------
+    x : array_like
+        Real values.
+    axis : int
+        The axis along which to work.
+
+    Returns
+    -------
+    float or ndarray, or of a pandas table a Series
+
+    Raises
+    ------
+    ValueError
+        If x is empty.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.stats.mean([1.0, 2.0, 6.0])
+    3.0
+    """
+    return along(core.mean, x, axis)
+
+
+def rms(x, axis=LAST):
+    """The root of the mean square, of real or complex values.
+
+    Parameters
+    ----------
+    x : array_like
+        Real or complex values.
+    axis : int
+        The axis along which to work.
+
+    Returns
+    -------
+    float or ndarray, or of a pandas table a Series
+
+    Raises
+    ------
+    ValueError
+        If x is empty.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.stats.rms([3.0, 4.0]) ** 2
+    12.500000000000002
+    """
+    return either(core.rms, core.rms_complex, x, axis)
+
+
+def moment(x, order, axis=LAST):
+    r"""The central moment.
+
+    .. math:: \frac1n \sum_i (x_i - \bar x)^m
+
+    Parameters
+    ----------
+    x : array_like
+        Real values.
+    order : int
+        The power m.
+    axis : int
+        The axis along which to work.
+
+    Returns
+    -------
+    float or ndarray, or of a pandas table a Series
+
+    Raises
+    ------
+    ValueError
+        If x is empty or order is below 1.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.stats.moment([1.0, 2.0, 6.0], 2)
+    4.666666666666667
+    """
+    order = whole_number("stats.moment", "order", order, 1, "ErrOrderNotPositive")
+    return along(lambda channel: core.moment(channel, order), x, axis)
+
+
+def var(x, axis=LAST, ddof=0):
+    """The variance.
+
+    Parameters
+    ----------
+    x : array_like
+        Real values.
+    axis : int
+        The axis along which to work.
+    ddof : int
+        The sum of squares is divided by n - ddof; 1 for the variance of what the samples are drawn from.
+
+    Returns
+    -------
+    float or ndarray, or of a pandas table a Series
+
+    Raises
+    ------
+    ValueError
+        If x is empty, or has not more than ddof values.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.stats.var([1.0, 2.0, 6.0], ddof=1)
+    7.0
+    """
+    def of_channel(channel):
+        n = len(channel)
+        if n and n <= ddof:
+            refuse("stats.var", "ddof", f"must be below the number of values, {n}; {ddof} came", "ErrSizesDisagree")
+        return core.moment(channel, 2) * (n / (n - ddof) if n else 1.0)
+
+    return along(of_channel, x, axis)
+
+
+def std(x, axis=LAST, ddof=0):
+    """The standard deviation, the root of the variance.
+
+    Parameters
+    ----------
+    x : array_like
+        Real values.
+    axis : int
+        The axis along which to work.
+    ddof : int
+        As of `var`.
+
+    Returns
+    -------
+    float or ndarray, or of a pandas table a Series
+
+    Raises
+    ------
+    ValueError
+        If x is empty, or has not more than ddof values.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.stats.std([1.0, 3.0])
+    1.0
+    """
+    return np.sqrt(var(x, axis, ddof))
+
+
+def skew(x, axis=LAST):
+    """The skewness: the third central moment by the power 3/2 of the second.
+
+    Parameters
+    ----------
+    x : array_like
+        Real values.
+    axis : int
+        The axis along which to work.
+
+    Returns
+    -------
+    float or ndarray, or of a pandas table a Series
+
+    Raises
+    ------
+    ValueError
+        If x is empty.
+
+    Examples
+    --------
+    >>> import qx
+    >>> round(qx.stats.skew([1.0, 2.0, 6.0]), 6)
+    0.59517
+    """
+    return along(lambda channel: core.moment(channel, 3) / core.moment(channel, 2)**1.5, x, axis)
+
+
+def kurtosis(x, axis=LAST, fisher=True):
+    """The kurtosis: the fourth central moment by the square of the second.
+
+    Parameters
+    ----------
+    x : array_like
+        Real values.
+    axis : int
+        The axis along which to work.
+    fisher : bool
+        Less the 3 of a normal distribution.
+
+    Returns
+    -------
+    float or ndarray, or of a pandas table a Series
+
+    Raises
+    ------
+    ValueError
+        If x is empty.
+
+    Examples
+    --------
+    >>> import qx
+    >>> round(qx.stats.kurtosis([1.0, 2.0, 6.0]), 6)
+    -1.5
+    """
+    return along(lambda channel: core.moment(channel, 4) / core.moment(channel, 2)**2, x, axis) - 3 * bool(fisher)
+
+
+def median(x, axis=LAST):
+    """The median.
+
+    Parameters
+    ----------
+    x : array_like
+        Real values.
+    axis : int
+        The axis along which to work.
+
+    Returns
+    -------
+    float or ndarray, or of a pandas table a Series
+
+    Raises
+    ------
+    ValueError
+        If x is empty or has NaN.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.stats.median([1.0, 2.0, 6.0])
+    2.0
+    """
+    return along(core.median, x, axis)
+
+
+def mode(x, intervals=0):
+    """The most frequent values, rising.
+
+    Parameters
+    ----------
+    x : array_like
+        Real values.
+    intervals : int
+        With a number above 0, the centres of the fullest of so many bins of equal width.
+
+    Returns
+    -------
+    ndarray of float64
+        Empty where nothing is there twice.
+
+    Raises
+    ------
+    ValueError
+        If x is empty.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.stats.mode([1.0, 2.0, 2.0, 3.0])
+    array([2.])
+    """
+    return core.mode(as_array(x).ravel(), whole_number("stats.mode", "intervals", intervals, 0))
+
+
+def mse(x, y):
+    """The mean square of the differences.
+
+    Parameters
+    ----------
+    x, y : array_like
+        Real values of one length.
+
+    Returns
+    -------
+    float
+
+    Raises
+    ------
+    ValueError
+        If x is empty, or differs from y in length.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.stats.mse([1.0, 2.0], [1.0, 4.0])
+    2.0
+    """
+    x, y = as_array(x).ravel(), as_array(y).ravel()
+    if x.shape != y.shape:
+        refuse("stats.mse", "x, y", f"must be of one length; {len(x)} and {len(y)} came", "ErrSizeMismatch")
+    return core.mse(x, y)
+
+
+def histogram(x, bins=10):
+    """Counts in bins of equal width from the least to the greatest value, or in bins of one's own.
+
+    Parameters
+    ----------
+    x : array_like
+        Real values.
+    bins : int or array_like
+        How many bins, or their edges, rising; the last bin includes its upper edge.
+
+    Returns
+    -------
+    Histogram
+
+    Raises
+    ------
+    ValueError
+        If x is empty, or the edges do not rise.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.stats.histogram([1.0, 2.0, 2.5, 5.0], 2).counts
+    array([3, 1], dtype=int32)
+    """
+    x = as_array(x).astype(float).ravel()
+    if np.ndim(bins) == 0:
+        bins = whole_number("stats.histogram", "bins", bins, 1)
+        counts, centres = core.histogram(x, bins)
+        return Histogram(counts, np.linspace(np.nanmin(x), np.nanmax(x), bins + 1), centres)
+    edges = as_array(bins).astype(float)
+    if edges.ndim != 1 or len(edges) < 2 or np.any(np.diff(edges) < 0):
+        refuse("stats.histogram", "bins", "the edges must be two or more and rise", "ErrRangeReversed")
+    intervals = [(low, high, 0) for low, high in zip(edges[:-1], edges[1:])]
+    intervals[-1] = (edges[-2], edges[-1], 2)
+    return Histogram(core.histogram_intervals(x, intervals)[0], edges, (edges[1:] + edges[:-1]) / 2)
+
+
+def contingency(table):
+    r"""Pearson's test of independence on a table of counts.
+
+    .. math:: \chi^2 = \sum (O - E)^2 / E
+
+    Parameters
+    ----------
+    table : array_like
+        Counts, at least 2 by 2.
+
+    Returns
+    -------
+    Test
+
+    Raises
+    ------
+    ValueError
+        If the table is too small or a count is negative.
+
+    Examples
+    --------
+    >>> import qx
+    >>> round(qx.stats.contingency([[10, 20], [20, 10]]).statistic, 6)
+    6.666667
+    """
+    table = as_array(table)
+    statistic, p = core.contingency(table)
+    return Test(statistic, p, ((table.shape[0] - 1) * (table.shape[1] - 1),))
+
+
+def anova(*samples):
+    """The analysis of variance of samples of one factor: whether their means differ.
+
+    Parameters
+    ----------
+    *samples : array_like
+        The values at each level.
+
+    Returns
+    -------
+    Anova
+
+    Raises
+    ------
+    ValueError
+        If there are fewer than two samples, or one is empty.
+
+    Examples
+    --------
+    >>> import qx
+    >>> round(qx.stats.anova([1.0, 2.0, 3.0], [2.0, 3.0, 4.0]).f[0], 9)
+    1.5
+    """
+    groups = [as_array(one).astype(float).ravel() for one in samples]
+    y = np.concatenate(groups) if groups else np.empty(0)
+    labels = np.repeat(np.arange(len(groups), dtype=np.int32), [len(one) for one in groups])
+    between, mean_between, ratio, p, error, mean_error, total = core.anova(y, labels, len(groups))
+    nan, k, n = math.nan, len(groups), len(y)
+    return Anova(("between", "within", "total"), np.array([between, error, total]), np.array([k - 1, n - k, n - 1.0]),
+                 np.array([mean_between, mean_error, nan]), np.array([ratio, nan, nan]), np.array([p, nan, nan]))
+
+
+def _coded(function, y, labels, random):
+    """y, the labels as numbers, and the counts of levels, negative for random factors as the exports have
+    them."""
+    y = as_array(y).astype(float).ravel()
+    codes, levels = [], []
+    for labels_of_one, is_random in zip(labels, random):
+        found, code = np.unique(as_array(labels_of_one).ravel(), return_inverse=True)
+        if len(code) != len(y):
+            refuse(function, "labels", f"must be as many as values, {len(y)}; {len(code)} came",
+                   "ErrSizeMismatch")
+        codes.append(code.astype(np.int32))
+        levels.append(-len(found) if is_random else len(found))
+    cells = math.prod(map(abs, levels))
+    if not cells or len(y) % cells:
+        refuse(function, "y", f"must have as many values in each of the {cells} cells; {len(y)} came",
+               "ErrAnovaCountMismatch")
+    return y, codes, levels, len(y) // cells
+
+
+def _table(sources, found):
+    sums, dof, means, ratios, p = (np.asarray(part, float) for part in found[:5])
+
+    def whole(part):
+        return np.concatenate([part, np.full(len(sources) - len(part), math.nan)])
+
+    return Anova(sources, *map(whole, (sums, dof, means, ratios, p)))
+
+
+def anova2(y, a, b, random=(False, False)):
+    """The analysis of variance of two factors, with as many values in each cell.
+
+    Parameters
+    ----------
+    y : array_like
+        The values.
+    a, b : array_like
+        The level of each factor for each value: numbers or words.
+    random : (bool, bool)
+        Whether the levels of a factor are drawn at random from many.
+
+    Returns
+    -------
+    Anova
+        With the rows A, B, AB, error and total.
+
+    Raises
+    ------
+    ValueError
+        If lengths differ, or cells have different numbers of values.
+
+    Examples
+    --------
+    >>> import qx
+    >>> y = [1.0, 2.0, 2.0, 4.0, 5.0, 5.0, 9.0, 7.0]
+    >>> qx.stats.anova2(y, [0, 0, 0, 0, 1, 1, 1, 1], [0, 0, 1, 1, 0, 0, 1, 1]).f[:3].round(3)
+    array([32.111,  9.   ,  1.   ])
+    """
+    y, codes, levels, count = _coded("stats.anova2", y, (a, b), random)
+    return _table(("A", "B", "AB", "error", "total"), core.anova2(y, *codes, *levels, count))
+
+
+def anova3(y, a, b, c, random=(False, False, False)):
+    """The analysis of variance of three factors, with as many values in each cell.
+
+    Parameters
+    ----------
+    y : array_like
+        The values.
+    a, b, c : array_like
+        The level of each factor for each value: numbers or words.
+    random : (bool, bool, bool)
+        Whether the levels of a factor are drawn at random from many.
+
+    Returns
+    -------
+    Anova
+        With the rows A, B, C, AB, AC, BC, ABC, error and total.
+
+    Raises
+    ------
+    ValueError
+        If lengths differ, or cells have different numbers of values.
+
+    Examples
+    --------
+    >>> import numpy as np, qx
+    >>> y = np.arange(16.0) ** 2
+    >>> a, b, c = np.indices((2, 2, 2)).reshape(3, -1).repeat(2, 1)
+    >>> qx.stats.anova3(y, a, b, c).dof
+    array([ 1.,  1.,  1.,  1.,  1.,  1.,  1.,  8., 15.])
+    """
+    y, codes, levels, count = _coded("stats.anova3", y, (a, b, c), random)
+    return _table(("A", "B", "C", "AB", "AC", "BC", "ABC", "error", "total"),
+                  core.anova3(y, *codes, *levels, count))
+
+
+@result
+class Summary(Result):
+    """What is known of the values so far.
+
+    Attributes
+    ----------
+    count : int
+        How many.
+    mean, std, rms, least, greatest : float or ndarray
+        Their mean, population standard deviation, root mean square, least and greatest.
+    """
+
+    count: int
+    mean: float
+    std: float
+    rms: float
+    least: float
+    greatest: float
+
+
+class Running(Stream):
+    """Statistics of a stream: each block returns the `Summary` of all values so far, with the bits of one
+    piece.
+
+    Parameters
+    ----------
+    channels : int, optional
+        How many channels a block of two dimensions has; without it blocks have one dimension.
+    axis : int
+        The axis of time in a block of two dimensions.
+
+    Examples
+    --------
+    >>> import qx
+    >>> running = qx.stats.Running()
+    >>> (running([1.0, 2.0]).mean, running([6.0]).mean)
+    (1.5, 3.0)
+    """
+
+    dtypes = (np.dtype(float),)
+
+    def __init__(self, channels=None, axis=-1):
+        super().__init__(channels, axis)
+
+    def _start(self):
+        """Count, first value, sums of differences from it and of their squares, least, greatest."""
+        return 0, 0.0, 0.0, 0.0, math.inf, -math.inf
+
+    def _step(self, state, block):
+        count, first, total, squares, least, greatest = state
+        first = first if count else float(block[0])
+        away = block - first
+        # Sums from the first value to the last, whatever the blocks are.
+        total = float(np.cumsum(np.concatenate([[total], away]))[-1])
+        squares = float(np.cumsum(np.concatenate([[squares], away * away]))[-1])
+        return np.empty(0), (count + len(block), first, total, squares, min(least, float(block.min())),
+                             max(greatest, float(block.max())))
+
+    def __call__(self, block):
+        super().__call__(block)
+        return self.summary()
+
+    def summary(self):
+        """The Summary so far; NaN where there was no value."""
+        parts = []
+        for count, first, total, squares, least, greatest in self._states:
+            n = count or math.nan
+            mean, variance = first + total / n, max(squares / n - (total / n)**2, 0.0) if count else math.nan
+            parts.append((mean, math.sqrt(variance) if count else math.nan,
+                          math.sqrt(variance + mean * mean) if count else math.nan, least, greatest))
+        columns = [np.array(column) for column in zip(*parts)]
+        if self.channels is None:
+            columns = [float(column[0]) for column in columns]
+        return Summary(self._states[0][0], *columns)
+
+    def finish(self):
+        """The Summary of all; begins anew."""
+        found = self.summary()
+        self.reset()
+        return found
