@@ -140,8 +140,9 @@ class Displacement:
         return qx.calculus.displacement(self.a, FS)
 
     def theirs(self):
-        v = scipy.integrate.cumulative_trapezoid(scipy.signal.detrend(self.a), dx=1 / FS, initial=0)
-        return scipy.signal.detrend(scipy.integrate.cumulative_trapezoid(scipy.signal.detrend(v), dx=1 / FS, initial=0))
+        v = scipy.integrate.cumulative_trapezoid(self.a, dx=1 / FS, initial=0)
+        d = scipy.integrate.cumulative_trapezoid(v, dx=1 / FS, initial=0)
+        return d - np.polyval(np.polyfit(T, d, 2), T)
 
     def error(self, found):
         return np.abs(found - self.truth).max() / 0.01

@@ -4,6 +4,7 @@ import doctest
 import importlib
 import inspect
 import pickle
+import subprocess
 import sys
 import threading
 import unittest
@@ -45,8 +46,12 @@ class Names(unittest.TestCase):
             self.assertEqual(public, sorted(public), topic)
             for key, name in keys.items():
                 self.assertIn(name, qx.names())
-                self.assertTrue(any(key == one or key.startswith(f"{one}_") for one in public),
-                                f"{topic}.{key}")
+                self.assertIn(newest.function_of(topic, key), public)
+
+    def test_the_page_of_exports_and_topics_is_up_to_date(self):
+        tool = PYTHON.parent / "tools/topics_table.py"
+        self.assertEqual(subprocess.run([sys.executable, tool, "--check"]).returncode, 0,
+                         f"{tool} writes docs/topics.md")
 
     def test_every_function_has_a_text_with_its_arguments(self):
         for topic, module in TOPICS.items():

@@ -196,6 +196,15 @@ def served(topic):
     return Served(topic)
 
 
+def function_of(topic, key):
+    """The public function or class that a key of the table belongs to."""
+    public = importlib.import_module(f"..{topic}", __package__).__all__
+    fitting = [name for name in public if key == name or key.startswith(f"{name}_")]
+    if not fitting:
+        raise LookupError(f"the key {topic}.{key} belongs to no function")
+    return max(fitting, key=len)
+
+
 def public_names():
     """Where the public names of all topics are: name to topics."""
     found = {}

@@ -1,0 +1,106 @@
+#!/usr/bin/python3
+"""Writes docs/topics.md: each export with the function of a topic that serves it, or why there is none.
+
+    topics_table.py [--check]
+
+With --check nothing is written, and the status tells whether the page is up to date.
+"""
+
+import fnmatch
+import sys
+from pathlib import Path
+
+ROOT = Path(__file__).resolve().parent.parent
+sys.path.insert(0, str(ROOT / "python"))
+from qx.library import library  # noqa: E402
+from qx.topical.newest import NEWEST, TOPICS, function_of  # noqa: E402
+
+PAGE = ROOT / "docs/topics.md"
+ELDER, TWIN, HOST, NONE = "elder, for comparison", "for hosts: plan in instance data", "for hosts", "none yet"
+# What the table of topical/newest.py does not name, by patterns in order: the functions that do the same by
+# another export, and a remark.
+OTHERS = (
+    ("*_IDP", TWIN), ("*UnreserveProc measurements_* *AnalysisWorkspaceH SetQXRTModule *_oxfft_table", HOST),
+    ("InitialMatrixH CxInitialMatrixH *Aligned*", HOST),
+    ("BWCoefs", "filters.butterworth"), ("ChebyshevCoefs", "filters.chebyshev1"),
+    ("InvChebyshevCoefs", "filters.chebyshev2"), ("EllipticCoefs", "filters.elliptic"),
+    ("BesselCoefs", "filters.bessel"), ("MedianFilterCIN", "filters.median"),
+    ("zeroPhase*", "filters.Filter.zero_phase"), ("*IIR_Filter_PtbyPt *IIR_Filter_OneState", "filters.Filter.stream"),
+    ("CxIIR*Filter_H FIRNarrow* FIRnarrow* CxSigFIRnarrow*", NONE),
+    ("InvCxOXFFTH80", "fft.ifft"), ("InvReOXFFTH80", "fft.irfft"), ("ReInvFFT2D_H", "fft.ifft2"),
+    ("DCT_2DH", "fft.dct over both axes"), ("InvDCT_2DH", "fft.idct over both axes"),
+    ("DST_2DH", "fft.dst over both axes"), ("InvDST_2DH", "fft.idst over both axes"), ("*DZTH", NONE),
+    ("*WinH *Wind* Kaiser* CxKaiser* *CosTapered* TriangleWin", "windows.get, windows.apply"),
+    ("WinConstByNameH*", "windows.constants"), ("*CrossSpectrumH", "spectra.csd"),
+    ("SinePtrn", "signals.sine"), ("Square", "signals.square"), ("RampPtrn*", "signals.ramp"),
+    ("unWrap", "signals.unwrap"), ("Rxy AutoCorrelation", "signals.correlate"), ("Norm2", "signals.standardize"),
+    ("Scale QScale QS1D", "signals.rescale"), ("Line1 LinEv", "NumPy: a * x + b"),
+    ("Riffle*Num_head", "noise.permutation"), ("RiffleArray*", "noise.shuffle"),
+    ("Decimate* CxDecimate_H *DecimatedMovingAverageH", "multirate.decimate"),
+    ("*RationalResample* InterpolatorFIRH DecimatorFIRH", "multirate.resample"),
+    ("*Resample_Const *Resample_Variable* InterpolatedFIRH", NONE),
+    ("*EqsBy* *EqsSetBy* *LinEqs TriLinEqs_head *CholeskyLinEqs_head CxTriLinEqs_head", "linalg.solve"),
+    ("*GenLinEqs*", "linalg.lstsq"), ("*InvMatrix* PreallocInv*", "linalg.inv"),
+    ("Cholesky_head CxCholesky_head", "linalg.cholesky"), ("*qrd_head", "linalg.qr"), ("*SVD_head", "linalg.svd"),
+    ("TriDiag*", "linalg.solve_banded"), ("*Schur_head", "linalg.schur"), ("*QZ_head", "linalg.qz"),
+    ("MatrixSqrt_head", "linalg.sqrtm"), ("*Sylvester_head", "linalg.solve_sylvester"),
+    ("*Lyapunov_head", "linalg.solve_lyapunov"), ("*nitVector*", "x / linalg.norm(x)"),
+    ("MatrixMul_head AxBCxCIN AxVect_head AxVectorCx *vectxA_head CxVectxA_head DotP* Dotprod*", "NumPy: a @ b"),
+    ("*ranspose_head *Compact* OuterProd*", "NumPy: a.T, numpy.tril, numpy.outer"),
+    ("*CheckSym_head *CheckPosSemiDef_head *Balance_head *EigenVBack_head *GSVD_head", NONE),
+    ("*AutoCorrMtrxH CreateMatrixFromEVs_head", NONE),
+    ("CxPolyRoots_head PolyRootsNtBst_head", "poly.roots"),
+    ("LinFit*", "fit.line"), ("PolyFit*", "fit.polynomial"), ("GenLSFit_head", "fit.linear"), ("ExpFit*", "fit.exponential"),
+    ("PowerFit*", "fit.power"), ("LogFit*", "fit.logarithm"), ("GaussianPeakFit*", "fit.gaussian"),
+    ("ConfBnd*", "fit.Fit.confidence"), ("PredBnd*", "fit.Fit.prediction"), ("GoodnessOfFit_head", "fit.Fit"),
+    ("SpInterp_head", "interpolate.CubicSpline"),
+    ("NumerIntegration_head", "calculus.integrate"), ("NumerIntegration2D_head", "calculus.integrate2"),
+    ("NumerIntegration3D*", NONE), ("Integral*", "calculus.cumulative"), ("Derivative", "calculus.derivative"),
+    ("Anova1Way*", "stats.anova"), ("Anova2Way*", "stats.anova2"), ("ANOVA3Way*", "stats.anova3"),
+    ("QX_Gamma", "special.gamma"), ("QX_Beta", "special.beta"), ("QX_Gauss", "special.hyp2f1"),
+    ("QX_Elliptic1", "special.ellipk"), ("QX_Elliptic2", "special.ellipe"),
+    ("PeakD20*", "measure.PeakFinder"), ("PeakDetector", "measure.trigger"), ("PulseMeas PulseParameters", "measure.pulses"),
+    ("CycleRMSAverage", NONE), ("Triggerh", "measure.trigger"),
+    ("CoordRotationEuler_head", "coordinates.rotate_euler"), ("Euler2Direction_head", "coordinates.euler_to_matrix"),
+)
+
+
+def served():
+    """The functions that call each export."""
+    found = {}
+    for topic in TOPICS:
+        for key, export in NEWEST.get(topic, {}).items():
+            function = f"{topic}.{function_of(topic, key)}"
+            if function not in found.setdefault(export, []):
+                found[export].append(function)
+    return found
+
+
+def remark(name):
+    for patterns, text in OTHERS:
+        if any(fnmatch.fnmatchcase(name, pattern) for pattern in patterns.split()):
+            return text if text in (TWIN, HOST, NONE) else f"{text} ({ELDER})" if "." in text and "NumPy" not in text \
+                else text
+    raise LookupError(f"nothing serves {name}: name it in topical/newest.py or in {Path(__file__).name}")
+
+
+def page():
+    functions = served()
+    lines = ["# Exports and topics", "",
+             "Each export with the functions of the Python topics that call it. Another revision or form of what a",
+             "topic calls is an elder, kept for comparison; `qx.exports` has all of them. Written by",
+             "`tools/topics_table.py` from `python/qx/topical/newest.py`.", ""]
+    for family in library().catalogue["families"]:
+        names = [name for name, entry in library().entries.items() if entry["family"] == family["name"]]
+        if names:
+            lines += [f"## {family['name']}", "", "| export | function |", "|---|---|"]
+            lines += [f"| `{name}` | {', '.join(functions[name]) if name in functions else remark(name)} |"
+                      for name in names]
+            lines.append("")
+    return "\n".join(lines)
+
+
+if __name__ == "__main__":
+    if "--check" in sys.argv:
+        sys.exit(PAGE.read_text("utf-8") != page())
+    PAGE.write_text(page(), "utf-8")
