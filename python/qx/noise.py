@@ -46,8 +46,7 @@ class Generator:
         if seed is not None:
             seed = whole_number("noise.Generator", "seed", seed, 1, "ErrCountNotPositive")
             if seed > LARGEST_SEED:
-                refuse("noise.Generator", "seed", f"must be at most {LARGEST_SEED}; {seed} came",
-                       "ErrOverflow")
+                refuse("noise.Generator", "seed", f"must be at most {LARGEST_SEED}; {seed} came")
         self.seed = seed
         self.reset()
 

@@ -47,6 +47,7 @@ class Spectrum(Result):
     segments: int
     scaling: str
     _unpacked = ("frequencies", "values")
+    _axis = -1  # of the frequencies in the values
 
     @property
     def amplitude(self):
@@ -60,20 +61,20 @@ class Spectrum(Result):
             return 10 * np.log10(self.values)
 
     def power(self, low=-np.inf, high=np.inf):
-        """The power between two frequencies, the lines at both included: of the whole spectrum the mean
-        square of what was detrended. Only of a density with its channels along the first axes."""
+        """The power between two frequencies, the lines at both included: of the whole density the mean
+        square of what was detrended."""
         if self.scaling != "density":
             refuse("spectra.Spectrum.power", "self", "only a density has a power in a band")
         inside = (self.frequencies >= low) & (self.frequencies <= high)
         width = abs(self.frequencies[1] - self.frequencies[0]) if len(self.frequencies) > 1 else 1.0
-        return self.values[..., inside].sum(-1) * width
+        return np.compress(inside, self.values, self._axis).sum(self._axis) * width
 
     def plot(self, axes=None):
         """Draws the values in decibels with matplotlib; returns the axes."""
         if axes is None:
             from matplotlib import pyplot
             axes = pyplot.subplots()[1]
-        axes.plot(self.frequencies, self.decibels.T)
+        axes.plot(self.frequencies, np.moveaxis(np.asarray(self.decibels), self._axis, 0))
         axes.set(xlabel="frequency", ylabel="density (dB)" if self.scaling == "density" else "power (dB)")
         axes.grid(True, alpha=0.3)
         return axes
@@ -233,6 +234,27 @@ class _Segments:
     def powers(self, x):
         return np.concatenate([found.real**2 + found.imag**2 for found in self.spectra(x)])
 
+    def mean_power(self, x):
+        """The mean of the powers. Of real values two segments go through one transform, as real and
+        imaginary part: its power at k and n - k is that of both together."""
+        cut = np.lib.stride_tricks.sliding_window_view(x, self.length)[::self.step]
+        n, total = self.size, 0.0
+        rows_at_once = max(2, AT_ONCE // n & ~1)
+        for first in range(0, len(cut), rows_at_once):
+            rows = self._trendless(cut[first:first + rows_at_once]) * self.window
+            if not self.is_complex:
+                pairs = np.zeros(((len(rows) + 1) // 2, n), complex)
+                pairs.real[:, :self.length] = rows[::2]
+                pairs.imag[:len(rows) // 2, :self.length] = rows[1::2]
+                rows = pairs
+            elif n > self.length:
+                rows = np.pad(rows, ((0, 0), (0, n - self.length)))
+            for row in rows:
+                total = total + core.welch_power(row)
+        if not self.is_complex:
+            total = (total + np.roll(total[::-1], 1))[:len(self.frequencies)] / 2
+        return total * (float(n) * n / self.count)
+
     def sums(self, x, y):
         """The sums of |X|^2, |Y|^2 and conj(X) Y over the segments."""
         xx, yy, xy = 0.0, 0.0, 0.0
@@ -308,12 +330,14 @@ def welch(x, fs=1.0, window="hann", nperseg=None, noverlap=None, nfft=None, detr
                     scaling, _is_complex(x))
 
     def of_channel(channel):
+        if average == "mean":
+            return cut.mean_power(channel) * cut.scale
         powers = cut.powers(channel)
-        if average == "median":
-            return np.median(powers, 0) / _median_bias(len(powers)) * cut.scale
-        return powers.mean(0) * cut.scale
+        return np.median(powers, 0) / _median_bias(len(powers)) * cut.scale
 
-    return Spectrum(cut.frequencies, along(of_channel, x, axis), cut.resolution, cut.count, cut.scaling)
+    found = Spectrum(cut.frequencies, along(of_channel, x, axis), cut.resolution, cut.count, cut.scaling)
+    found._axis = 0 if axis is LAST and is_pandas(x) else int(axis)
+    return found
 
 
 def periodogram(x, fs=1.0, window="boxcar", nfft=None, detrend="constant", scaling="density", axis=LAST):

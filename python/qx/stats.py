@@ -76,6 +76,8 @@ class Anova(Result):
         Ratios of variances; NaN where there is none.
     p : ndarray
         Probabilities of larger ones by chance.
+    critical : ndarray
+        What f exceeds by chance with the probability `significance`.
     """
 
     sources: tuple
@@ -84,18 +86,17 @@ class Anova(Result):
     means: np.ndarray
     f: np.ndarray
     p: np.ndarray
+    critical: np.ndarray
 
     def _rows(self):
         def text(value):
             return "" if np.isnan(value) else f"{value:.6g}"
-        yield "", "sum", "dof", "mean", "F", "p"
-        for row in zip(self.sources, self.sums, self.dof, self.means, self.f, self.p):
+        yield "Anova", "sum", "dof", "mean", "F", "p", "critical F"
+        for row in zip(self.sources, self.sums, self.dof, self.means, self.f, self.p, self.critical):
             yield row[0], *map(text, row[1:])
 
     def __repr__(self):
-        return "\n".join("Anova" + row[0].rjust(8) + "".join(cell.rjust(13) for cell in row[1:])
-                         if not i else row[0].ljust(13) + "".join(cell.rjust(13) for cell in row[1:])
-                         for i, row in enumerate(self._rows()))
+        return "\n".join(row[0].ljust(8) + "".join(cell.rjust(13) for cell in row[1:]) for row in self._rows())
 
     def _repr_html_(self):
         rows = "".join("<tr>" + "".join(f"<td>{cell}</td>" for cell in row) + "</tr>" for row in self._rows())
@@ -511,13 +512,15 @@ def contingency(table):
     return Test(statistic, p, ((table.shape[0] - 1) * (table.shape[1] - 1),))
 
 
-def anova(*samples):
+def anova(*samples, significance=0.05):
     """The analysis of variance of samples of one factor: whether their means differ.
 
     Parameters
     ----------
     *samples : array_like
         The values at each level.
+    significance : float
+        For the critical values.
 
     Returns
     -------
@@ -537,10 +540,12 @@ def anova(*samples):
     groups = [as_array(one).astype(float).ravel() for one in samples]
     y = np.concatenate(groups) if groups else np.empty(0)
     labels = np.repeat(np.arange(len(groups), dtype=np.int32), [len(one) for one in groups])
-    between, mean_between, ratio, p, error, mean_error, total = core.anova(y, labels, len(groups))
+    between, mean_between, ratio, p, error, mean_error, total, critical = core.anova(
+        y, labels, len(groups), float(significance))
     nan, k, n = math.nan, len(groups), len(y)
     return Anova(("between", "within", "total"), np.array([between, error, total]), np.array([k - 1, n - k, n - 1.0]),
-                 np.array([mean_between, mean_error, nan]), np.array([ratio, nan, nan]), np.array([p, nan, nan]))
+                 np.array([mean_between, mean_error, nan]), np.array([ratio, nan, nan]), np.array([p, nan, nan]),
+                 np.array([critical, nan, nan]))
 
 
 def _coded(function, y, labels, random):
@@ -563,15 +568,15 @@ def _coded(function, y, labels, random):
 
 
 def _table(sources, found):
-    sums, dof, means, ratios, p = (np.asarray(part, float) for part in found[:5])
+    parts = [np.asarray(part, float) for part in (*found[:5], found[6])]
 
     def whole(part):
         return np.concatenate([part, np.full(len(sources) - len(part), math.nan)])
 
-    return Anova(sources, *map(whole, (sums, dof, means, ratios, p)))
+    return Anova(sources, *map(whole, parts))
 
 
-def anova2(y, a, b, random=(False, False)):
+def anova2(y, a, b, random=(False, False), significance=0.05):
     """The analysis of variance of two factors, with as many values in each cell.
 
     Parameters
@@ -582,6 +587,8 @@ def anova2(y, a, b, random=(False, False)):
         The level of each factor for each value: numbers or words.
     random : (bool, bool)
         Whether the levels of a factor are drawn at random from many.
+    significance : float
+        For the critical values.
 
     Returns
     -------
@@ -601,10 +608,10 @@ def anova2(y, a, b, random=(False, False)):
     array([32.111,  9.   ,  1.   ])
     """
     y, codes, levels, count = _coded("stats.anova2", y, (a, b), random)
-    return _table(("A", "B", "AB", "error", "total"), core.anova2(y, *codes, *levels, count))
+    return _table(("A", "B", "AB", "error", "total"), core.anova2(y, *codes, *levels, count, float(significance)))
 
 
-def anova3(y, a, b, c, random=(False, False, False)):
+def anova3(y, a, b, c, random=(False, False, False), significance=0.05):
     """The analysis of variance of three factors, with as many values in each cell.
 
     Parameters
@@ -615,6 +622,8 @@ def anova3(y, a, b, c, random=(False, False, False)):
         The level of each factor for each value: numbers or words.
     random : (bool, bool, bool)
         Whether the levels of a factor are drawn at random from many.
+    significance : float
+        For the critical values.
 
     Returns
     -------
@@ -636,7 +645,7 @@ def anova3(y, a, b, c, random=(False, False, False)):
     """
     y, codes, levels, count = _coded("stats.anova3", y, (a, b, c), random)
     return _table(("A", "B", "C", "AB", "AC", "BC", "ABC", "error", "total"),
-                  core.anova3(y, *codes, *levels, count))
+                  core.anova3(y, *codes, *levels, count, float(significance)))
 
 
 @result

@@ -25,7 +25,7 @@ NEWEST = {
     },
     "fft": {
         "fft": "CxOXFFTH", "fft_real": "ReOXFFTH", "fft_sized": "CxOXFFTH80",
-        "fft_real_sized": "ReOXFFTH80", "ifft": "InvCxOXFFTH", "rfft": "ReOXFFTH",
+        "fft_real_sized": "ReOXFFTH80", "ifft": "InvCxOXFFTH", "rfft": "ReOXFFTH", "rfft_long": "ReOXFFTHCH",
         "rfft_sized": "ReOXFFTH80", "irfft": "InvReOXFFTH", "fft2": "CxFFT2D_H", "fft2_real": "ReFFT2D_H",
         "ifft2": "CxInvFFT2D_H", "dct": "DCT_1DH", "idct": "InvDCT_1DH", "dst": "DST_1DH",
         "idst": "InvDST_1DH", "hartley": "FHTH", "ihartley": "InvFHTH",
@@ -39,7 +39,7 @@ NEWEST = {
     },
     "spectra": {
         "welch": "ReOXFFTH", "welch_sized": "ReOXFFTH80", "welch_complex": "CxOXFFTH",
-        "welch_complex_sized": "CxOXFFTH80", "power": "SpectrumH", "power_complex": "CxSpectrumH",
+        "welch_complex_sized": "CxOXFFTH80", "welch_power": "CxSpectrumH", "power": "SpectrumH", "power_complex": "CxSpectrumH",
         "analytic": "FastHilbertTransformH", "instantaneous_phase": "unWrap85",
     },
     "signals": {
@@ -161,8 +161,8 @@ NEWEST = {
         "mean": "Mean_head", "rms": "RMS_head", "rms_complex": "CxRMS_head",
         "moment": "Moment_head", "median": "Median_head", "mode": "ModeH", "mse": "MSE_head",
         "histogram": "histgran_head", "histogram_intervals": "GenHistH",
-        "contingency": "Contingency_head", "anova": "Anova1Way_head", "anova2": "Anova2Way_head",
-        "anova3": "ANOVA3Way_head", "norm_cdf": "NormDist_head", "norm_ppf": "InvNdist_head",
+        "contingency": "Contingency_head", "anova": "Anova1Way_head_2017", "anova2": "Anova2Way_head_2017",
+        "anova3": "ANOVA3Way_head_2017", "norm_cdf": "NormDist_head", "norm_ppf": "InvNdist_head",
         "t_cdf": "TDist_head", "t_ppf": "InvTdist_head", "chi2_cdf": "ChiSquare_head",
         "chi2_ppf": "InvChiSquare_head", "f_cdf": "FDist_head", "f_ppf": "InvFDist_head",
     },
