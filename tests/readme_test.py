@@ -68,15 +68,17 @@ AFTERWARDS = {
 
 def commands(readme):
     """The commands of the README and the texts of its blocks, as bash lines, in their order."""
-    language, block, lines = None, [], []
+    language, block, lines, python = None, [], [], []
     for line in readme.split("\n"):
         if line.startswith("```"):
             if language == "c":
                 lines.append("cat >first.c <<'END'\n" + "\n".join(block) + "\nEND")
             elif language == "python":
-                # Its last line shows how a failure is raised.
-                lines.append("{ python3 - 2>&1 || true; } <<'END' | grep 'QxError: Mean_head.*ErrEmptyInput'\n" +
-                             "\n".join(block) + "\nEND")
+                # A block goes on where the one before ended; a last line may show how a failure is raised.
+                python += block
+                run = "{ python3 - 2>&1 || true; } <<'END' | grep 'Error: Mean_head.*ErrEmptyInput'\n" \
+                    if "raises" in block[-1] else "python3 - <<'END'\n"
+                lines.append(run + "\n".join(python) + "\nEND")
             language, block = line[3:] if language is None else None, []
         elif language is not None:
             block.append(line)

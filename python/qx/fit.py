@@ -542,7 +542,8 @@ def gaussian(x, y, sigma=None, offset=True, bounds=None, guess=None, method="lea
     --------
     >>> import numpy as np, qx
     >>> x = np.linspace(-3, 3, 40)
-    >>> {name: round(value, 6) for name, value in qx.fit.gaussian(x, 2 * np.exp(-0.5 * (x - 1)**2 / 0.25) + 1).parameters.items()}
+    >>> fit = qx.fit.gaussian(x, 2 * np.exp(-0.5 * (x - 1)**2 / 0.25) + 1)
+    >>> {name: round(value, 6) for name, value in fit.parameters.items()}
     {'a': 2.0, 'm': 1.0, 's': 0.5, 'c': 1.0}
     """
     x, y, w = _samples("gaussian", x, y, sigma)

@@ -393,7 +393,8 @@ def cic_decimate(x, factor, stages=3, differential_delay=1, axis=LAST):
     >>> qx.multirate.cic_decimate([1.0] * 6, 2, 1)
     array([0.5, 1. , 1. ])
     """
-    return along(lambda channel: core.cic_decimate(channel, EMPTY, stages, factor, differential_delay, 0, 1, 0)[0], x, axis)
+    return along(lambda channel: core.cic_decimate(channel, EMPTY, stages, factor, differential_delay, 0, 1, 0)[0],
+                 x, axis)
 
 
 def cic_interpolate(x, factor, stages=3, differential_delay=1, axis=LAST):
@@ -427,7 +428,8 @@ def cic_interpolate(x, factor, stages=3, differential_delay=1, axis=LAST):
     >>> qx.multirate.cic_interpolate([1.0, 2.0], 2, 1)
     array([1., 1., 2., 2.])
     """
-    return along(lambda channel: core.cic_interpolate(channel, EMPTY, stages, factor, differential_delay, 0, 1, 0)[0], x, axis)
+    return along(lambda channel: core.cic_interpolate(channel, EMPTY, stages, factor, differential_delay, 0, 1, 0)[0],
+                 x, axis)
 
 
 class FrequencyShift(Stream):

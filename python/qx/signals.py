@@ -33,10 +33,15 @@ def _wave(name, n, frequency, fs, amplitude, phase, *more):
 
 def _of_times(name, t, *arguments):
     """A pulse at times of the caller's, of any shape."""
+    times = _times(name, t)
+    return getattr(core, name)(times.ravel(), 0, *arguments).reshape(times.shape)
+
+
+def _times(name, t):
     times = np.asarray(t, float)
     if not times.size:
         refuse(f"signals.{name}", "t", "is empty", "ErrEmptyInput")
-    return getattr(core, name)(times.ravel(), 0, *arguments).reshape(times.shape)
+    return times
 
 
 def sine(n, frequency, fs=1.0, amplitude=1.0, phase=0.0):
@@ -458,7 +463,8 @@ def gauss_monopulse(t, fc, amplitude=1.0):
     >>> qx.signals.gauss_monopulse([0.0, 0.1], 5).round(6)
     array([0.      , 0.037251])
     """
-    return core.gauss_monopulse(_times("gauss_monopulse", t).ravel(), 0, 1.0, 0.0, float(fc), float(amplitude)).reshape(np.shape(t))
+    times = _times("gauss_monopulse", t)
+    return core.gauss_monopulse(times.ravel(), 0, 1.0, 0.0, float(fc), float(amplitude)).reshape(times.shape)
 
 
 def triangle_pulse(t, width=1.0, skew=0.5, amplitude=1.0):
@@ -588,13 +594,6 @@ def frequency_modulated(x, fc, fs=1.0):
     array([1., 0., 0., 1.])
     """
     return _modulated("frequency_modulated", vector(x, "signals.frequency_modulated", "x"), fc, fs)
-
-
-def _times(name, t):
-    times = np.asarray(t, float)
-    if not times.size:
-        refuse(f"signals.{name}", "t", "is empty", "ErrEmptyInput")
-    return times
 
 
 def _modulated(name, x, fc, fs):

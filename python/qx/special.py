@@ -340,7 +340,8 @@ def expn(n, x):
 def sici(x):
     r"""The sine and the cosine integral.
 
-    .. math:: \mathrm{Si}(x) = \int_0^x \frac{\sin t}{t} dt,\quad \mathrm{Ci}(x) = \gamma + \ln |x| + \int_0^x \frac{\cos t - 1}{t} dt
+    .. math:: \mathrm{Si}(x) = \int_0^x \frac{\sin t}{t} dt,\quad
+              \mathrm{Ci}(x) = \gamma + \ln |x| + \int_0^x \frac{\cos t - 1}{t} dt
 
     Parameters
     ----------

@@ -410,7 +410,9 @@ def power(x, axis=LAST):
 
 def _pair(function, x, y, fs, window, nperseg, noverlap, nfft, detrend, axis):
     """The segments of two signals and their sums, channel by channel."""
-    x, y = as_array(x), as_array(y)
+    if axis is LAST and is_pandas(x):
+        axis = 0
+    x, y = (one.to_numpy() if is_pandas(one) else as_array(one) for one in (x, y))
     if x.shape != y.shape:
         refuse(function, "x, y", f"must have one shape; {x.shape} and {y.shape} came", "ErrSizeMismatch")
     is_complex = x.dtype.kind == "c" or y.dtype.kind == "c"

@@ -222,7 +222,8 @@ class Calculus(unittest.TestCase):
 
     def test_functions(self):
         for f, a, b, expected in ((np.cos, 0, 2, np.sin(2)), (lambda x: 1 / np.sqrt(x), 0, 1, 2),
-                                  (lambda x: np.exp(-x), 0, np.inf, 1), (lambda x: 1 / (1 + x * x), -np.inf, np.inf, np.pi),
+                                  (lambda x: np.exp(-x), 0, np.inf, 1),
+                                  (lambda x: 1 / (1 + x * x), -np.inf, np.inf, np.pi),
                                   (lambda x: np.exp(1j * x), 0, 1, np.sin(1) + 1j * (1 - np.cos(1))),
                                   (np.cos, 2, 0, -np.sin(2)), (lambda x: np.abs(x - 0.3), 0, 1, 0.29)):
             value, error = calculus.quad(f, a, b)

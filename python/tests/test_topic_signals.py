@@ -69,6 +69,10 @@ class Spectra(unittest.TestCase):
         close(spectra.csd(x[0], 1j * y[0], 10, **given).values,
               scipy.signal.csd(x[0], 1j * y[0], 10, return_onesided=False, **given)[1])
         self.assertRaisesRegex(ValueError, "x, y: must have one shape", spectra.csd, x, y[0])
+        tables = [pandas.DataFrame(one.T) for one in (x, y)]
+        close(spectra.csd(*tables, 10, **given).values.T, spectra.csd(x, y, 10, **given).values)
+        found = spectra.welch(tables[0], 10)
+        close(found.power(), spectra.welch(x, 10).power())
 
     def test_spectrogram(self):
         x = RNG.normal(size=(2, 1500))

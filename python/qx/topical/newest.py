@@ -9,8 +9,9 @@ import importlib
 from ..calls import export, hint
 from ..library import library
 
+# In the order in which they are shown.
 TOPICS = ("filters", "fft", "windows", "spectra", "signals", "noise", "multirate", "linalg", "poly", "fit",
-          "interpolate", "calculus", "stats", "special", "measure", "coordinates")  # in the order in which they are shown
+          "interpolate", "calculus", "stats", "special", "measure", "coordinates")
 
 NEWEST = {
     "filters": {
@@ -39,7 +40,8 @@ NEWEST = {
     },
     "spectra": {
         "welch": "ReOXFFTH", "welch_sized": "ReOXFFTH80", "welch_complex": "CxOXFFTH",
-        "welch_complex_sized": "CxOXFFTH80", "welch_power": "CxSpectrumH", "power": "SpectrumH", "power_complex": "CxSpectrumH",
+        "welch_complex_sized": "CxOXFFTH80", "welch_power": "CxSpectrumH", "power": "SpectrumH",
+        "power_complex": "CxSpectrumH",
         "analytic": "FastHilbertTransformH", "instantaneous_phase": "unWrap85",
     },
     "signals": {
