@@ -235,8 +235,8 @@ class Filter:
             b, a = self._b.reshape(-1, 3), self._a.reshape(-1, 2)
             return np.hstack([b, np.ones((len(b), 1)), a])
         if max(len(self._b), len(self._a)) > 3:
-            refuse("filters.Filter.sos", "self", "a quotient of a higher order than 2 has no sections "
-                   "here; poles and zeros has it", "ErrCoefficientSizes")
+            refuse("filters.Filter.sos", "self", "is a quotient of a higher order than 2, which is "
+                   "not taken apart into sections", "ErrCoefficientSizes")
         a = np.r_[self._a, np.zeros(3 - len(self._a))] if len(self._a) else np.array([1.0, 0, 0])
         return np.r_[np.r_[self._b, np.zeros(3 - len(self._b))], a][None] / a[0]
 

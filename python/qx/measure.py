@@ -14,7 +14,7 @@ from .topical import (LAST, Result, Stream, along, chosen, refuse, result, serve
                       whole_number)
 
 __all__ = ["Bands", "Harmonics", "Levels", "PeakFinder", "Peaks", "Pulse", "Tone", "Tones", "Trigger",
-           "Triggers", "band_frequencies", "delay", "harmonics", "levels", "octave_bands",
+           "Triggers", "Vertices", "band_frequencies", "delay", "harmonics", "levels", "octave_bands",
            "peaks", "pulses", "sound_level", "tone", "tones", "trigger", "weighting",
            "weighting_filter"]
 
@@ -168,6 +168,23 @@ class Pulse(Result):
 
 
 @result
+class Vertices(Result):
+    """Peaks of a stream.
+
+    Attributes
+    ----------
+    positions, heights : ndarray
+        Where the parabolas that are fitted to the samples have their vertices, and their values there.
+    """
+
+    positions: np.ndarray
+    heights: np.ndarray
+
+    def __len__(self):
+        return len(self.positions)
+
+
+@result
 class Triggers(Result):
     """Where a signal passes a level.
 
@@ -306,8 +323,8 @@ def _widths(values, at, stand):
 
 
 class PeakFinder(Stream):
-    """Peaks above a threshold, or valleys below it, in a stream: each block returns the places and heights
-    that it has made certain. A parabola is fitted to every window of `width` samples; a place counts from
+    """Peaks above a threshold, or valleys below it, in a stream: each block returns the `Vertices` that it
+    has made certain. A parabola is fitted to every window of `width` samples; a place counts from
     the start of the stream.
 
     Parameters
@@ -347,28 +364,31 @@ class PeakFinder(Stream):
         request = {"data": block, "threshold": self.threshold, "width": self.width,
                    "polarity": int(self.valleys), "flags": (not has_begun) + 4 * is_last}
         found, place, buffer = core.PeakFinder(request, place, buffer)
-        return Triggers(found["locations"] / self.fs, np.floor(found["locations"]).astype(int)), (
-            np.empty(0), place, buffer, True)
+        return Vertices(found["locations"] / self.fs, found["amplitudes"]), (np.empty(0), place, buffer, True)
 
     def _step(self, state, block):
         block = np.concatenate([state[0], block])
         if len(block) < 2 * self.width:
-            return _no_triggers(), (block, *state[1:])
+            return _no_vertices(), (block, *state[1:])
         # The rest stays in hand, so that a last block is long enough.
         found, state = self._run(state, block[:-self.width], False)
         return found, (block[-self.width:], *state[1:])
 
     def __call__(self, block):
         found = super().__call__(block)
-        return found if isinstance(found, Triggers) else _no_triggers()
+        return found if isinstance(found, Vertices) else _no_vertices()
 
     def finish(self):
         """The peaks of the last window; begins anew."""
         state = self._states[0]
         self.reset()
         if len(state[0]) < self.width:
-            return _no_triggers()
+            return _no_vertices()
         return self._run(state, state[0], True)[0]
+
+
+def _no_vertices():
+    return Vertices(np.empty(0), np.empty(0))
 
 
 def _no_triggers():

@@ -92,7 +92,7 @@ def is_failure(status):
     return status < 0 or status in HOST_FAILURES
 
 
-_kept = threading.local()  # the warnings of a thread that works for another one
+_kept = threading.local()  # the warnings of a thread that somebody else decides on
 
 
 def tell(export, status, results, place=""):
@@ -103,8 +103,7 @@ def tell(export, status, results, place=""):
 
 
 def warn(warning):
-    """Gives a warning at the line that called into the package; in a thread that works for another one
-    it is kept for that one."""
+    """Gives a warning at the line that called into the package, or keeps it under keeping()."""
     kept = getattr(_kept, "warnings", None)
     if kept is not None:
         kept.append(warning)
@@ -116,14 +115,9 @@ def warn(warning):
 
 
 def keeping(work, *arguments):
-    """The result of work, done in a thread for another one, and the warnings that it gave."""
-    _kept.warnings = []
+    """The result of work, done for somebody who decides on its warnings, and these warnings."""
+    before, _kept.warnings = getattr(_kept, "warnings", None), []
     try:
         return work(*arguments), _kept.warnings
     finally:
-        _kept.warnings = None
-
-
-def works_for_another():
-    """Whether this thread is one of those that keep their warnings."""
-    return getattr(_kept, "warnings", None) is not None
+        _kept.warnings = before

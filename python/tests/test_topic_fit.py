@@ -223,6 +223,7 @@ class Peaks(unittest.TestCase):
         found = np.concatenate([*parts, finder.finish().positions])
         self.assertEqual(found.tobytes(), expected.tobytes())
         close(found, measure.peaks(x, prominence=0.5).positions, 0, 0.15)
+        close(measure.PeakFinder(0.3, 7)(x).heights[:5], measure.peaks(x, prominence=0.5).heights[:5], 0, 0.01)
 
     @hypothesis.given(strategies.lists(strategies.integers(0, 300), max_size=6),
                       strategies.sampled_from([*measure.SLOPES]), strategies.sampled_from([0.0, 20.0]))

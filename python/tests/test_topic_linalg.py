@@ -2,6 +2,7 @@
 
 import sys
 import unittest
+import unittest.mock
 import warnings
 from pathlib import Path
 
@@ -70,6 +71,15 @@ class Systems(unittest.TestCase):
                            (lambda: linalg.solve(np.eye(2), [1, 2], "diagonal"), ValueError)):
             self.assertRaises(kind, call)
 
+    def test_warnings_of_stacks_reach_the_caller(self):
+        u = np.linalg.qr(some(60, 60))[0]
+        bad = u @ np.diag(np.geomspace(1, 1e-13, 60)) @ u.T
+        with warnings.catch_warnings(record=True) as given, \
+                unittest.mock.patch("qx.topical.axes.processors", lambda: 2):
+            warnings.simplefilter("always")
+            linalg.solve(np.stack([bad] * 12), np.ones((12, 60)))
+        self.assertEqual([Path(one.filename).name for one in given], [Path(__file__).name])
+
     def test_the_condition_estimate_is_near(self):
         for n in (60, 150):
             for a in (some(n, n), scipy.linalg.toeplitz(0.9 ** np.arange(n)), np.tril(np.ones((n, n)))):
@@ -90,7 +100,8 @@ class Systems(unittest.TestCase):
                 close(found.singular_values, expected[3])
                 close(linalg.pinv(a), np.linalg.pinv(a), 1e-8, 1e-6)
         a[:, 3] = a[:, 0]
-        self.assertEqual((linalg.lstsq(a, b[:, 0]).rank, linalg.matrix_rank(a)), (3, 3))
+        with self.assertWarnsRegex(qx.QxWarning, "WarnRankDeficient"):
+            self.assertEqual((linalg.lstsq(a, b[:, 0]).rank, linalg.matrix_rank(a)), (3, 3))
         ab = np.array([[0, 1, 1, 1], [4.0, 4, 4, 4], [1, 1, 1, 0]])
         close(linalg.solve_banded((1, 1), ab, np.ones((4, 2))), scipy.linalg.solve_banded((1, 1), ab, np.ones((4, 2))))
 

@@ -11,7 +11,7 @@ from concurrent.futures import ThreadPoolExecutor
 
 import numpy as np
 
-from ..outcomes import keeping, warn, works_for_another
+from ..outcomes import keeping, warn
 
 ENOUGH = 1 << 15  # elements from which on threads are worth their while
 
@@ -33,12 +33,19 @@ class _Workers:
     """The threads, made when they are first needed; a forked process makes its own."""
 
     def __init__(self):
-        self.pool, self.lock = None, threading.Lock()
+        self.pool, self.lock, self.here = None, threading.Lock(), threading.local()
+
+    def is_one(self):
+        """Whether this thread is one of them, which must not wait for the others."""
+        return getattr(self.here, "is_worker", False)
+
+    def _begin(self):
+        self.here.is_worker = True
 
     def get(self):
         with self.lock:
             if self.pool is None:
-                self.pool = ThreadPoolExecutor(processors(), "qx")
+                self.pool = ThreadPoolExecutor(processors(), "qx", self._begin)
             return self.pool
 
 
@@ -54,7 +61,7 @@ def processors():
 
 def many(function, channels, size):
     """The results of the function for each of the channels, in order; `size` elements in all."""
-    if len(channels) < 2 or size < ENOUGH or processors() < 2 or works_for_another():
+    if len(channels) < 2 or size < ENOUGH or processors() < 2 or _workers.is_one():
         return [function(channel) for channel in channels]
     done = list(_workers.get().map(lambda channel: keeping(function, channel), channels))
     told = {(warning.export, warning.code): warning for _, kept in done for warning in kept}
