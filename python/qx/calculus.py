@@ -9,8 +9,8 @@ from . import windows
 from .topical import LAST, Result, along, chosen, refuse, result, served, whole_number
 from .topical.axes import as_array
 
-__all__ = ["Quadrature", "cumulative", "derivative", "displacement", "integrate", "integrate2", "quad",
-           "simpson", "trapezoid", "velocity"]
+__all__ = ["Quadrature", "cumulative", "derivative", "displacement", "integrate", "integrate2",
+           "integrate3", "quad", "simpson", "trapezoid", "velocity"]
 
 core = served("calculus")
 
@@ -187,6 +187,44 @@ def integrate2(y, dx=1.0, dy=1.0, rule="simpson"):
     """
     code = chosen("calculus.integrate2", "rule", rule, {name: RULES[name] for name in [*RULES][:4]})
     return core.integrate2(as_array(y), [float(dx), float(dy)], code)
+
+
+def integrate3(y, dx=1.0, dy=1.0, dz=1.0, rule="simpson"):
+    """The integral over three dimensions.
+
+    Parameters
+    ----------
+    y : array_like
+        Samples y[plane, row, column].
+    dx, dy, dz : float
+        The distances of samples in a row, of rows, and of planes.
+    rule : {"trapezoid", "simpson", "simpson38", "boole"}
+        As of `integrate`.
+
+    Returns
+    -------
+    float
+
+    Raises
+    ------
+    ValueError
+        If there are not three dimensions, one is below 3 or shorter than a panel, or rule is none of its
+        words.
+
+    Examples
+    --------
+    >>> import numpy as np, qx
+    >>> qx.calculus.integrate3(np.ones((3, 5, 4)))
+    24.0
+    """
+    code = chosen("calculus.integrate3", "rule", rule, {name: RULES[name] for name in [*RULES][:4]})
+    y = as_array(y)
+    if y.ndim != 3:
+        refuse("calculus.integrate3", "y", f"three dimensions are needed; {y.ndim} came", "ErrSizesDisagree")
+    # The export has sizes of its own: so many rows, columns, planes, with the planes one behind the other.
+    planes, rows, columns = y.shape
+    return core.integrate3(np.ascontiguousarray(y, float).reshape(rows, columns, planes),
+                           [float(dx), float(dy), float(dz)], code)
 
 
 def cumulative(y, x=None, dx=1.0, rule="corrected", axis=LAST):

@@ -17,7 +17,8 @@ from .topical import (LAST, Result, Stream, along, chosen, count_of, either, ref
                       whole_number)
 
 __all__ = ["Filter", "FilterStream", "Response", "bessel", "butterworth", "chebyshev1", "chebyshev2",
-           "elliptic", "equiripple", "from_ba", "from_sos", "median", "savgol", "windowed"]
+           "elliptic", "equiripple", "from_ba", "from_sos", "median", "narrow", "savgol",
+           "windowed"]
 
 core = served("filters")
 
@@ -296,7 +297,8 @@ class Filter:
         in the middle of the pass band. `response().delay` has it for each frequency."""
         if not self.is_iir:
             h = self.taps
-            if np.array_equal(h, h[::-1]) or np.array_equal(h, -h[::-1]):
+            rounding = 1e-12 * np.abs(h).max()
+            if min(np.abs(h - h[::-1]).max(), np.abs(h + h[::-1]).max()) <= rounding:
                 return (len(h) - 1) / 2
         main = self._main
         if main is None:
@@ -789,6 +791,62 @@ def equiripple(taps, bands, desired, weight=None, kind="symmetric", fs=1.0):
                   (edges[2 * best] + edges[2 * best + 1]) / 2 / fs)
     made.ripple = ripple
     return made
+
+
+def narrow(edges, kind="lowpass", ripple=0.1, attenuation=60.0, fs=1.0):
+    """A filter of linear phase for a narrow band, designed in two stages: a filter with zeros between
+    its taps, and one that takes away its images.
+
+    Parameters
+    ----------
+    edges : sequence of float
+        The edges of the bands, rising, in the unit of fs: two of a lowpass or a highpass, four of the
+        others, about one centre.
+    kind : {"lowpass", "highpass", "bandpass", "bandstop"}
+        What passes.
+    ripple : float
+        How far the gain may be from 1, in dB.
+    attenuation : float
+        How far the gain is down in the stop band, in dB.
+    fs : float
+        The sampling rate.
+
+    Returns
+    -------
+    Filter
+        With all taps of both stages.
+
+    Raises
+    ------
+    ValueError
+        If the edges do not rise between 0 and fs / 2 or are not as many as kind needs, or ripple or
+        attenuation is not above 0.
+
+    Examples
+    --------
+    >>> import qx
+    >>> f = qx.filters.narrow((10, 20), fs=1000)
+    >>> bool(f.response([30]).decibels[0] < -60)
+    True
+    """
+    name = "filters.narrow"
+    code = chosen(name, "kind", kind, KINDS)
+    edges = np.asarray(edges, float).ravel()
+    if len(edges) != (2 if code < 2 else 4):
+        refuse(name, "edges", f"a {kind} needs {2 if code < 2 else 4}; {len(edges)} came", "ErrSizesDisagree")
+    if np.any(np.diff(edges) <= 0) or edges[0] <= 0 or edges[-1] >= fs / 2:
+        refuse(name, "edges", f"must rise between 0 and half the sampling rate, {fs / 2:g}", "ErrBadCutoff")
+    if code < 2:
+        (fpass, fstop), centre = edges[::1 if code == 0 else -1], 0.0
+    else:
+        inner, outer, centre = edges[2] - edges[1], edges[3] - edges[0], edges.mean()
+        fpass, fstop = (inner, outer) if code == 2 else (outer, inner)
+    design = core.narrow(fs, float(fpass), float(fstop), float(centre), 10 ** (ripple / 20) - 1,
+                         float(attenuation), code, {})
+    taps = core.narrow_filter([1.0], design)
+    main = (0.0, 0.5, centre / fs, 0.0)[code]
+    return Filter(taps, EMPTY, False, fs, f"narrow {kind}, edges {', '.join(f'{edge:g}' for edge in edges)}, fs {fs:g}",
+                  main)
 
 
 def from_sos(sos, fs=1.0):

@@ -14,12 +14,13 @@ from .outcomes import QxWarning, keeping, warn
 from .topical import Result, chosen, refuse, result, served, whole_number
 from .topical.axes import as_array, many
 
-__all__ = ["Eigen", "Hessenberg", "LU", "LeastSquares", "QR", "QZ", "SVD", "Schur", "charpoly",
-           "cholesky", "companion", "cond", "det", "eig", "eigh", "eigvals", "eigvalsh",
-           "expm", "hessenberg", "inv", "is_positive_definite", "kron", "logm", "lstsq", "lu",
-           "matrix_power", "matrix_rank", "norm", "pinv", "qr", "qz", "schur", "solve",
-           "solve_banded", "solve_discrete_lyapunov", "solve_lyapunov", "solve_sylvester",
-           "sqrtm", "svd", "svdvals", "toeplitz", "trace"]
+__all__ = ["Eigen", "GSVD", "Hessenberg", "LU", "LeastSquares", "QR", "QZ", "SVD", "Schur", "balance",
+           "charpoly", "cholesky", "companion", "cond", "det", "eig", "eigh", "eigvals",
+           "eigvalsh", "expm", "gsvd", "hessenberg", "inv", "is_positive_definite",
+           "is_symmetric", "kron", "logm", "lstsq", "lu", "matrix_power", "matrix_rank",
+           "norm", "pinv", "qr", "qz", "schur", "solve", "solve_banded",
+           "solve_discrete_lyapunov", "solve_lyapunov", "solve_sylvester", "sqrtm", "svd",
+           "svdvals", "toeplitz", "trace"]
 
 core = served("linalg")
 
@@ -1349,6 +1350,127 @@ def is_positive_definite(a):
     True
     """
     return bool(_served("is_positive_definite", _matrix("linalg.is_positive_definite", a, True))(as_array(a)))
+
+
+def is_symmetric(a, tolerance=0.0):
+    """Whether a matrix is symmetric, a complex one Hermitian, within a tolerance.
+
+    Parameters
+    ----------
+    a : array_like
+        A square matrix, real or complex.
+    tolerance : float
+        By how much elements may differ.
+
+    Returns
+    -------
+    bool
+
+    Raises
+    ------
+    numpy.linalg.LinAlgError
+        If a is not square.
+    ValueError
+        If a is empty or has an element that is not finite.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.linalg.is_symmetric([[1.0, 2.0], [2.0, 1.0]])
+    True
+    """
+    a = _matrix("linalg.is_symmetric", a, True)
+    more = (1,) if a.dtype.kind == "c" else ()
+    return bool(_served("is_symmetric", a)(a, float(tolerance), 0, *more))
+
+
+def balance(a):
+    """A square matrix balanced for the calculation of eigenvalues: rows and columns exchanged and
+    multiplied by powers of two (B. N. Parlett and C. Reinsch, 1969).
+
+    Parameters
+    ----------
+    a : array_like
+        A square matrix, real or complex.
+
+    Returns
+    -------
+    two ndarrays
+        The balanced matrix, and t with a t = t balanced.
+
+    Raises
+    ------
+    numpy.linalg.LinAlgError
+        If a is not square.
+    ValueError
+        If a is empty or has an element that is not finite.
+
+    Examples
+    --------
+    >>> import qx
+    >>> balanced, t = qx.linalg.balance([[1.0, 1024.0], [0.0009765625, 1.0]])
+    >>> balanced
+    array([[1., 1.],
+           [1., 1.]])
+    """
+    a = _matrix("linalg.balance", a, True)
+    balanced, low, high, scale = _served("balance", a)(a, 3)
+    return balanced, _served("balance_back", a)(3, 0, low, high, scale, np.eye(len(a)))
+
+
+
+@result
+class GSVD(Result):
+    """A generalised singular value decomposition of a and b.
+
+    Attributes
+    ----------
+    alpha, beta : ndarray
+        The generalised singular values are alpha / beta; alpha^2 + beta^2 = 1.
+    u, v, q : ndarray
+        Unitary.
+    rank : int
+        The rank of a and b together.
+    """
+
+    alpha: np.ndarray
+    beta: np.ndarray
+    u: np.ndarray
+    v: np.ndarray
+    q: np.ndarray
+    rank: int
+
+
+def gsvd(a, b):
+    """The generalised singular values of two matrices with as many columns.
+
+    Parameters
+    ----------
+    a, b : array_like
+        Matrices.
+
+    Returns
+    -------
+    GSVD
+
+    Raises
+    ------
+    ValueError
+        If a matrix is empty, or they differ in columns.
+
+    Examples
+    --------
+    >>> import qx
+    >>> found = qx.linalg.gsvd([[3.0, 0.0], [0.0, 1.0]], [[1.0, 0.0], [0.0, 1.0]])
+    >>> (found.alpha / found.beta).round(9)
+    array([3., 1.])
+    """
+    a, b = _matrix("linalg.gsvd", a), _matrix("linalg.gsvd", b, argument="b")
+    if a.shape[-1] != b.shape[-1]:
+        refuse("linalg.gsvd", "b", f"must have as many columns as a, {a.shape[-1]}; {b.shape[-1]} came",
+               "ErrSizesDisagree")
+    _, _, alpha, beta, u, v, q, k, rank_b = _served("gsvd", a, b)(a, b)
+    return GSVD(alpha[:k + rank_b], beta[:k + rank_b], u, v, q, k + rank_b)
 
 
 def kron(a, b):

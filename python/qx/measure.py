@@ -10,13 +10,14 @@ import math
 import numpy as np
 
 from . import measuring, windows
+from .outcomes import QxError
 from .topical import (LAST, Result, Stream, along, chosen, refuse, result, served, vector,
                       whole_number)
 
-__all__ = ["Bands", "Harmonics", "Levels", "PeakFinder", "Peaks", "Pulse", "Tone", "Tones", "Trigger",
-           "Triggers", "Vertices", "band_frequencies", "delay", "harmonics", "levels", "octave_bands",
-           "peaks", "pulses", "sound_level", "tone", "tones", "trigger", "weighting",
-           "weighting_filter"]
+__all__ = ["Bands", "Cycles", "Harmonics", "Levels", "PeakFinder", "Peaks", "Pulse", "Tone", "Tones",
+           "Trigger", "Triggers", "Vertices", "band_frequencies", "cycles", "delay",
+           "harmonics", "levels", "octave_bands", "peaks", "pulses", "sound_level", "tone",
+           "tones", "trigger", "weighting", "weighting_filter"]
 
 core = served("measure")
 
@@ -464,6 +465,72 @@ def pulses(x, fs=1.0, first="rising"):
                   *((one.first_duration / fs, one.second_duration / fs)[::1 if one.rises else -1]),
                   one.slew_rate * fs, one.first_overshoot, one.second_overshoot)
             for one in measuring.pulses(x, direction)]
+
+
+@result
+class Cycles(Result):
+    """Means over the cycles of a waveform.
+
+    Attributes
+    ----------
+    starts : ndarray
+        Their times.
+    periods : ndarray
+        Their durations.
+    means, rms : ndarray
+        The mean and the root mean square over each.
+    """
+
+    starts: np.ndarray
+    periods: np.ndarray
+    means: np.ndarray
+    rms: np.ndarray
+
+    def __len__(self):
+        return len(self.starts)
+
+
+def cycles(x, fs=1.0):
+    """Mean and root mean square over each cycle of a waveform, between crossings of the middle of its
+    two levels; up to 1000 cycles.
+
+    Parameters
+    ----------
+    x : array_like
+        Real values.
+    fs : float
+        The sampling rate.
+
+    Returns
+    -------
+    Cycles
+
+    Raises
+    ------
+    QxError
+        If there are no two levels.
+    ValueError
+        If x is empty or fs is not above 0.
+
+    Examples
+    --------
+    >>> import qx
+    >>> found = qx.measure.cycles(3 + qx.signals.sine(1000, 0.0101))
+    >>> found.means.round(2), found.rms.round(2)
+    (array([3., 3., 3., 3., 3., 3., 3., 3., 3.]), array([3.08, 3.08, 3.08, 3.08, 3.08, 3.08, 3.08, 3.08, 3.08]))
+    """
+    x, fs = vector(x, "measure.cycles", "x").astype(float), _rate("cycles", fs)
+    found = []
+    while len(found) < measuring.MOST_PULSES:
+        try:
+            _, mean, rms, start, end, *_ = core.cycles(x, 0.0, 1 / fs, len(found) + 1, measuring.REFERENCES,
+                                                       measuring.HISTOGRAM, 0)
+        except QxError as error:
+            if error.name in ("ErrMeasureSearchShort", "ErrMeasureNotFound"):
+                break
+            raise
+        found.append((start, end - start, mean, rms))
+    return Cycles(*np.array(found).reshape(-1, 4).T)
 
 
 def tone(x, fs=1.0, near=None, within=None):

@@ -69,6 +69,18 @@ class Designs(unittest.TestCase):
         hilbert = filters.equiripple(31, [0.05, 0.45], [1], kind="hilbert")
         close(hilbert.response([0.2]).magnitude, 1, 0.01)
 
+    def test_narrow_filters(self):
+        for kind, edges, passed, stopped in (
+                ("lowpass", (10, 15), (1, 9), (16, 450)), ("highpass", (10, 15), (16, 450), (1, 9)),
+                ("bandpass", (95, 98, 102, 105), (99, 101), (1, 94)),
+                ("bandstop", (95, 98, 102, 105), (1, 94), (99, 101))):
+            f = filters.narrow(edges, kind, 0.1, 60, 1000)
+            loss = -f.response(np.linspace(*passed, 50)).decibels
+            self.assertLess(np.abs(loss).max(), 0.11, kind)
+            self.assertGreater((-f.response(np.linspace(*stopped, 50)).decibels).min(), 59, kind)
+            self.assertFalse(f.is_iir)
+            self.assertEqual(f.delay, (len(f.taps) - 1) / 2)
+
     def test_sections_come_and_go(self):
         sos = scipy.signal.ellip(5, 1, 40, 0.2, output="sos")
         x = RNG.normal(size=300)

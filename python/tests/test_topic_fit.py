@@ -256,6 +256,15 @@ class Peaks(unittest.TestCase):
         inverted = measure.pulses(-x, 100, "falling")
         close([inverted[0].rise, inverted[0].fall], [0.32, 0.16], 0, 0.01)
 
+    def test_cycles(self):
+        x = 1 + 2 * signals.sine(4000, 7.03, 1000)
+        found = measure.cycles(x, 1000)
+        self.assertEqual(len(found), 27)
+        close(found.periods, 1 / 7.03, 1e-3)
+        close(found.means, 1, 0, 0.02)
+        close(found.rms, np.sqrt(3), 0, 0.02)
+        self.assertRaises(ValueError, measure.cycles, [])
+
     def test_delays(self):
         n, fs = 2000, 1000.0
         source = qx.filters.butterworth(6, 0.1)(qx.noise.gaussian(8 * n, seed=5))

@@ -152,6 +152,17 @@ class Decompositions(unittest.TestCase):
         for p in (None, 1, 2, np.inf, "fro"):
             close(linalg.cond(a, p), np.linalg.cond(a, p), 1e-8)
         close(linalg.norm(a[0], 3), np.linalg.norm(a[0], 3))
+        balanced, theirs = linalg.balance(a * np.geomspace(1, 1e6, 5)), scipy.linalg.matrix_balance(
+            a * np.geomspace(1, 1e6, 5))
+        close((a * np.geomspace(1, 1e6, 5)) @ balanced[1], balanced[1] @ balanced[0], 1e-9, 1e-6)
+        close(np.linalg.norm(balanced[0]), np.linalg.norm(theirs[0]), 0.5)
+        found = linalg.gsvd(a, b[:3])
+        close(found.alpha**2 + found.beta**2, 1)
+        finite = found.beta > 1e-8
+        close(np.sort(found.alpha[finite] / found.beta[finite])**-2,
+              np.sort(np.linalg.eigvalsh(np.linalg.inv(a).T @ b[:3].T @ b[:3] @ np.linalg.inv(a)))[2:][::-1], 1e-6)
+        self.assertEqual([linalg.is_symmetric(a), linalg.is_symmetric(a + a.T),
+                          linalg.is_symmetric(1j * (a - a.T))], [False, True, True])
         close(linalg.charpoly(a)[::-1], np.poly(a), 1e-8)
         close(linalg.kron(a, 1j * b), np.kron(a, 1j * b))
         close(linalg.toeplitz([1, 2, 3], [1, 5j, 6]), scipy.linalg.toeplitz([1, 2, 3], [1, 5j, 6]))
@@ -218,6 +229,9 @@ class Calculus(unittest.TestCase):
         noise = (-1.0) ** np.arange(1001)
         self.assertLess(np.abs(calculus.cumulative(noise)).max(), 2)
         self.assertGreater(np.abs(calculus.cumulative(noise, rule="simpson")).max(), 100)
+        u, v, w = x[:5]**2, x[:7], np.exp(x[:6])
+        whole = calculus.integrate3(u[:, None, None] * v[:, None] * w, x[1], x[1], x[1], "trapezoid")
+        close(whole, np.prod([np.trapz(one, dx=x[1]) for one in (u, v, w)]))
         close(calculus.integrate2(np.outer(y[1], y[2]), x[1], x[1], "boole"),
               2**5 / 5 * (np.exp(2) - 1), 1e-7)
 

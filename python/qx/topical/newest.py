@@ -15,6 +15,7 @@ TOPICS = ("filters", "fft", "windows", "spectra", "signals", "noise", "multirate
 
 NEWEST = {
     "filters": {
+        "narrow": "FIRNarrowCoef_head", "narrow_filter": "FIRnarrowFilter_head",
         "butterworth": "BWCoefs90", "chebyshev1": "ChebyshevCoefs90",
         "chebyshev2": "InvChebyshevCoefs90", "elliptic": "EllipticCoefs90", "bessel": "BesselCoefs90",
         "windowed": "FIRCoefs", "windowed_window": "AllWinH", "equiripple": "Parks",
@@ -70,6 +71,8 @@ NEWEST = {
         "shift_frequency": "ReComplexModulatorH", "shift_frequency_complex": "CxComplexModulatorH",
     },
     "linalg": {
+        "balance_back": "EigenVBack_head", "balance_back_complex": "CxEigenVBack_head", "gsvd": "GSVD_head", "gsvd_complex": "CxGSVD_head",
+        "is_symmetric": "CheckSym_head", "is_symmetric_complex": "CxCheckSym_head", "balance": "MatrixBalance_head", "balance_complex": "CxMatrixBalance_head",
         "lu": "LU_head", "lu_complex": "CxLU_head", "solve": "LULinEqs_head", "solve_complex":
         "CxLULinEqs_head", "solve_inverse": "LUInvMatrix_head", "solve_inverse_complex":
         "CxLUInvMatrix_head", "solve_triangular": "TriEqsSetDri_head", "solve_triangular_complex":
@@ -120,6 +123,7 @@ NEWEST = {
         "rational": "RatInterp_head",
     },
     "calculus": {
+        "integrate3": "NumerIntegration3D_2017_head",
         "integrate": "NumerIntegration_2017_head", "integrate2": "NumerIntegration2D_2017_head",
         "cumulative": "Integral_2017", "derivative": "Derivative85",
         "velocity": "PolyFit81_head",
@@ -169,6 +173,7 @@ NEWEST = {
         "chi2_ppf": "InvChiSquare_head", "f_cdf": "FDist_head", "f_ppf": "InvFDist_head",
     },
     "measure": {
+        "cycles": "CycleRMSAverage",
         "PeakFinder": "PeakD", "levels": "StateLevels", "pulses": "PulseMeasEx",
         "pulses_transition": "TransMeas", "tone": "SingleToneMeasurement",
         "tones": "MultipleToneMeasurements", "harmonics": "HarmonicAnalysis",
