@@ -223,7 +223,7 @@ def _each(function, *stacks):
 
 
 def _near_one(a):
-    """The matrix by the power of two next to its largest element, and that power. What stands on singular
+    """The matrix by the power of two next to its largest element, and that power. What is made of singular
     values loses digits for matrices of a norm far below 1."""
     largest = np.abs(a).max(initial=0)
     if not 0 < largest < np.inf:

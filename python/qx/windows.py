@@ -2,7 +2,7 @@ r"""Windows, by functions of their names or by words.
 
 A window of n values is symmetric, :math:`w_i = w_{n-1-i}`, for filters, or periodic,
 :math:`w_i = w_{n-i}`, for spectra: then it is the first n values of the symmetric one of n + 1. The
-functions give the symmetric form unless told otherwise, as those of `scipy.signal.windows` and of NumPy;
+functions give the symmetric form by default, as those of `scipy.signal.windows` and of NumPy;
 `get` and `apply`, which spectra use, the periodic one.
 
 F. J. Harris, "On the use of windows for harmonic analysis with the discrete Fourier transform", 1978,

@@ -214,6 +214,22 @@ class Multirate(unittest.TestCase):
         self.assertRaisesRegex(ValueError, "odd", multirate.resample, x, 2, 1, taps=[0.5, 0.5])
         self.assertRaisesRegex(ValueError, "up: must be at least 1", multirate.resample, x, 0)
 
+    def test_any_spacing(self):
+        for spacing in (0.7071, 1.3, 2.9):
+            w = 2 * np.pi * 0.39 * min(1, 1 / spacing)
+            x = np.exp(1j * (w * np.arange(3000) + 0.3))
+            found = multirate.respace(np.stack([x, 2 * x]), spacing, 2.25)
+            self.assertEqual(found.shape[1], int((2999 - 2.25) / spacing) + 1)
+            due = np.exp(1j * (w * (2.25 + spacing * np.arange(found.shape[1])) + 0.3))
+            inner = slice(len(due) // 6, -len(due) // 6)
+            close(found[1][inner], 2 * due[inner], 0, 1e-4)
+            close(multirate.respace(x.real, spacing, 2.25), found[0].real, 1e-9, 1e-12)
+        high = np.cos(2 * np.pi * 0.4 * np.arange(3000))  # would fold back
+        self.assertLess(np.abs(multirate.respace(high, 2.0)[300:-300]).max(), 1e-3)
+        self.assertEqual(multirate.respace([1.0, 2.0], 1.0, 5.0).size, 0)
+        for wrong in ({"spacing": 0}, {"spacing": 1, "start": -1}):
+            self.assertRaises(ValueError, multirate.respace, [1.0], **wrong)
+
     def test_single_precision_stays(self):
         x = RNG.normal(size=(2, 300))
         for dtype in (np.float32, np.complex64):

@@ -64,8 +64,8 @@ def many(function, channels, size):
     if len(channels) < 2 or size < ENOUGH or processors() < 2 or _workers.is_one():
         return [function(channel) for channel in channels]
     done = list(_workers.get().map(lambda channel: keeping(function, channel), channels))
-    told = {(warning.export, warning.code): warning for _, kept in done for warning in kept}
-    for warning in told.values():
+    given = {(warning.export, warning.code): warning for _, kept in done for warning in kept}
+    for warning in given.values():
         warn(warning)
     return [found for found, _ in done]
 

@@ -63,6 +63,7 @@ NEWEST = {
         "poisson": "PoissonNoiseH", "binomial": "BinomialNoiseH", "permutation": "RiffleIntNum2012_head",
     },
     "multirate": {
+        "respace": "Resample_Const", "respace_complex": "CxResample_Const",
         "resample": "ppMultiRateFIRH_DBL", "resample_single": "ppMultiRateFIRH_SGL",
         "resample_complex": "ppMultiRateFIRH_CDB", "resample_complex_single": "ppMultiRateFIRH_CSG",
         "decimate": "DecimateContinuous_H", "decimate_complex": "CxDecimateContinuous_H",
