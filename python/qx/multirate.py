@@ -7,7 +7,7 @@ import math
 
 import numpy as np
 
-from .topical import LAST, Stream, along, chosen, count_of, either, refuse, served, vector, whole_number
+from .topical import LAST, Stream, along, chosen, either, refuse, served, vector, whole_number
 
 __all__ = ["Decimator", "FrequencyShift", "MovingSum", "Resampler", "cic_decimate", "cic_interpolate",
            "decimate", "low_pass", "moving_average", "moving_sum", "resample", "respace",
@@ -160,8 +160,6 @@ def resample(x, up, down=1, axis=LAST, taps=None):
     >>> len(found), bool(abs(found[400:500] - qx.signals.sine(919, 10, fs=918.75)[400:500]).max() < 1e-5)
     (919, True)
     """
-    count_of(x, axis)
-
     def of_channel(channel):
         dtype = channel.dtype if channel.dtype in ALL_TYPES else np.dtype(float)
         stream = Resampler(up, down, dtype=dtype, taps=taps)

@@ -22,6 +22,10 @@ RNG = np.random.default_rng(7)
 def close(found, expected, rtol=1e-9, atol=1e-12):
     np.testing.assert_allclose(found, expected, rtol=rtol, atol=atol)
 
+# The same cases in each run, and no folder of earlier ones.
+hypothesis.settings.register_profile("same", derandomize=True, database=None)
+hypothesis.settings.load_profile("same")
+
 
 class Spectra(unittest.TestCase):
     @hypothesis.given(strategies.integers(1, 120), strategies.data(), strategies.booleans(),
