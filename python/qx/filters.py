@@ -90,6 +90,7 @@ class Filter:
         self._b.flags.writeable = self._a.flags.writeable = False
         self._is_cascade, self.fs, self.title = is_cascade, float(fs), title
         self._main = main  # a frequency of the pass band, in cycles per sample
+        self._rings = None  # _ringing(), once it is known
 
     # Applying
 
@@ -188,13 +189,11 @@ class Filter:
 
     def _ringing(self):
         """Samples until the impulse response has fallen to RINGING, by the largest pole."""
-        if not self.is_iir:
-            return 3 * len(self._b)
-        largest = float(np.abs(self.poles).max(initial=0))
-        if largest >= 1:
-            return 3 * len(self._b)
-        rings = math.ceil(math.log(RINGING) / math.log(largest)) if largest > 0 else 0
-        return max(rings, 3 * (len(self._b) + 1))
+        if self._rings is None:
+            largest = float(np.abs(self.poles).max(initial=0)) if self.is_iir else 0.0
+            rings = math.ceil(math.log(RINGING) / math.log(largest)) if 0 < largest < 1 else 0
+            self._rings = max(rings, 3 * len(self._b))
+        return self._rings
 
     def stream(self, channels=None, axis=-1, dtype=float):
         """The filter for blocks: all blocks together give the bits of `self(x)`.

@@ -9,6 +9,7 @@ Standard errors and bands take the scatter of the residuals; those of models tha
 parameters hold to first order.
 """
 
+import functools
 import inspect
 import math
 
@@ -176,6 +177,9 @@ class _Model:
         self.formula, self.names, self.value = formula, list(names), value
         self.jacobian = jacobian or self._differences
 
+    def __reduce__(self):
+        return self.made_by
+
     def _differences(self, x, p):
         columns = []
         for j, one in enumerate(p):
@@ -184,6 +188,77 @@ class _Model:
             above[j], below[j] = one + step, one - step
             columns.append((self.value(x, above) - self.value(x, below)) / (above[j] - below[j]))
         return np.stack(columns, -1)
+
+
+def _maker(build):
+    """A maker of models, which are pickled by its name and arguments."""
+    @functools.wraps(build)
+    def make(*arguments):
+        model = build(*arguments)
+        model.made_by = make, arguments
+        return model
+    return make
+
+
+def _or_without(offset, formula, names, value, columns):
+    """The model with or without its constant c."""
+    if offset:
+        return _Model(formula + " + c", [*names, "c"], lambda x, p: value(x, p) + p[-1],
+                      lambda x, p: np.stack([*columns(x, p), np.ones(len(x))], -1))
+    return _Model(formula, names, value, lambda x, p: np.stack(columns(x, p), -1))
+
+
+@_maker
+def _line():
+    return _Model("a x + b", "ab", lambda x, p: p[0] * x + p[1], lambda x, p: np.stack([x, np.ones(len(x))], -1))
+
+
+@_maker
+def _polynomial(degree):
+    terms = ["c0", "c1 x", *(f"c{j} x^{j}" for j in range(2, degree + 1))]
+    formula = " + ".join(terms[:degree + 1] if degree < 5 else [*terms[:3], "...", terms[degree]])
+    return _Model(formula, [f"c{j}" for j in range(degree + 1)],
+                  lambda x, p: np.polynomial.polynomial.polyval(x, p), lambda x, p: np.vander(x, len(p), True))
+
+
+@_maker
+def _exponential(offset):
+    return _or_without(offset, "a exp(b x)", ["a", "b"], lambda x, p: p[0] * np.exp(p[1] * x),
+                       lambda x, p: [np.exp(p[1] * x), p[0] * x * np.exp(p[1] * x)])
+
+
+@_maker
+def _power(offset):
+    return _or_without(offset, "a x^b", ["a", "b"], lambda x, p: p[0] * x**p[1],
+                       lambda x, p: [x**p[1], p[0] * x**p[1] * np.log(x)])
+
+
+@_maker
+def _logarithm():
+    return _Model("a ln(b x)", "ab", lambda x, p: p[0] * np.log(p[1] * x),
+                  lambda x, p: np.stack([np.log(p[1] * x), np.full(len(x), p[0] / p[1])], -1))
+
+
+@_maker
+def _gaussian(offset):
+    def bell(x, p):
+        return np.exp(-0.5 * ((x - p[1]) / p[2])**2)
+
+    return _or_without(offset, "a exp(-((x - m) / s)^2 / 2)", ["a", "m", "s"], lambda x, p: p[0] * bell(x, p),
+                       lambda x, p: [bell(x, p), p[0] * bell(x, p) * (x - p[1]) / p[2]**2,
+                                     p[0] * bell(x, p) * (x - p[1])**2 / p[2]**3])
+
+
+@_maker
+def _rows(names):
+    """y = H c, whose x are rows."""
+    return _Model("H c", names, lambda H, p: np.asarray(H, float) @ p, lambda H, p: np.asarray(H, float))
+
+
+@_maker
+def _any(f, names):
+    return _Model(f"{getattr(f, '__name__', 'f')}(x, {', '.join(names)})", names,
+                  lambda x, p: np.asarray(f(x, *p), float) + np.zeros(np.shape(x)))
 
 
 def _samples(function, x, y, sigma):
@@ -296,15 +371,13 @@ def line(x, y, sigma=None, bounds=None, method="least squares"):
       dof       2
     """
     x, y, w = _samples("line", x, y, sigma)
-    model = _Model("a x + b", "ab", lambda x, p: p[0] * x + p[1], lambda x, p: np.stack([x, np.ones(len(x))], -1))
-
     def run(y, x, w, start, lower, upper, code):
         if code == 0:
             return core.line(y, x, w, lower, upper)[1:3]
         export = core.line_absolute if code == 1 else core.line_bisquare
         return export(y, x, w, TOLERANCE, ITERATIONS, lower, upper)[2:4]
 
-    return _bounded("line", run, model, x, y, w, bounds, None, method, {})
+    return _bounded("line", run, _line(), x, y, w, bounds, None, method, {})
 
 
 def polynomial(x, y, degree, sigma=None, fixed=None):
@@ -348,19 +421,7 @@ def polynomial(x, y, degree, sigma=None, fixed=None):
     given = fixed or {}
     orders = [chosen("fit.polynomial", "fixed", name, {one: j for j, one in enumerate(names)}) for name in given]
     p = core.polynomial(x, y, degree, w, 0, orders, [float(value) for value in given.values()])[1]
-    terms = ["c0", "c1 x", *(f"c{j} x^{j}" for j in range(2, degree + 1))]
-    formula = " + ".join(terms[:degree + 1] if degree < 5 else [*terms[:3], "...", terms[degree]])
-    model = _Model(formula, names, lambda x, p: np.polynomial.polynomial.polyval(x, p),
-                   lambda x, p: np.vander(x, len(p), True))
-    return _finished(model, x, y, w, p, [name in given for name in names])
-
-
-def _with_offset(offset, formula, names, value, columns):
-    """The model with or without its constant c."""
-    if offset:
-        return _Model(formula + " + c", [*names, "c"], lambda x, p: value(x, p) + p[-1],
-                      lambda x, p: np.stack([*columns(x, p), np.ones(len(x))], -1)), {}
-    return _Model(formula, names, value, lambda x, p: np.stack(columns(x, p), -1)), {"c": 0.0}
+    return _finished(_polynomial(degree), x, y, w, p, [name in given for name in names])
 
 
 def exponential(x, y, sigma=None, offset=True, bounds=None, guess=None, method="least squares"):
@@ -403,11 +464,9 @@ def exponential(x, y, sigma=None, offset=True, bounds=None, guess=None, method="
     {'a': 3.0, 'b': -2.0, 'c': 1.0}
     """
     x, y, w = _samples("exponential", x, y, sigma)
-    model, fixed = _with_offset(
-        offset, "a exp(b x)", ["a", "b"], lambda x, p: p[0] * np.exp(p[1] * x),
-        lambda x, p: [np.exp(p[1] * x), p[0] * x * np.exp(p[1] * x)])
     return _bounded("exponential", lambda y, x, w, start, lower, upper, code: core.exponential(
-        y, x, w, TOLERANCE, ITERATIONS, start, lower, upper, code)[2:5], model, x, y, w, bounds, guess, method, fixed)
+        y, x, w, TOLERANCE, ITERATIONS, start, lower, upper, code)[2:5], _exponential(bool(offset)), x, y, w,
+        bounds, guess, method, {} if offset else {"c": 0.0})
 
 
 def power(x, y, sigma=None, offset=True, bounds=None, guess=None, method="least squares"):
@@ -452,11 +511,9 @@ def power(x, y, sigma=None, offset=True, bounds=None, guess=None, method="least 
     x, y, w = _samples("power", x, y, sigma)
     if np.any(x <= 0):
         refuse("fit.power", "x", "must be above 0", "ErrNotStrictlyPositive")
-    model, fixed = _with_offset(
-        offset, "a x^b", ["a", "b"], lambda x, p: p[0] * x**p[1],
-        lambda x, p: [x**p[1], p[0] * x**p[1] * np.log(x)])
     return _bounded("power", lambda y, x, w, start, lower, upper, code: core.power(
-        y, x, w, TOLERANCE, ITERATIONS, start, lower, upper, code)[2:5], model, x, y, w, bounds, guess, method, fixed)
+        y, x, w, TOLERANCE, ITERATIONS, start, lower, upper, code)[2:5], _power(bool(offset)), x, y, w,
+        bounds, guess, method, {} if offset else {"c": 0.0})
 
 
 def logarithm(x, y, sigma=None, bounds=None, guess=None, method="least squares"):
@@ -499,10 +556,8 @@ def logarithm(x, y, sigma=None, bounds=None, guess=None, method="least squares")
     x, y, w = _samples("logarithm", x, y, sigma)
     if np.any(x <= 0):
         refuse("fit.logarithm", "x", "must be above 0", "ErrNotStrictlyPositive")
-    model = _Model("a ln(b x)", "ab", lambda x, p: p[0] * np.log(p[1] * x),
-                   lambda x, p: np.stack([np.log(p[1] * x), np.full(len(x), p[0] / p[1])], -1))
     return _bounded("logarithm", lambda y, x, w, start, lower, upper, code: core.logarithm(
-        y, x, w, NATURAL, ITERATIONS, start, lower, upper, code, TOLERANCE)[2:4], model, x, y, w, bounds, guess,
+        y, x, w, NATURAL, ITERATIONS, start, lower, upper, code, TOLERANCE)[2:4], _logarithm(), x, y, w, bounds, guess,
         method, {})
 
 
@@ -547,16 +602,9 @@ def gaussian(x, y, sigma=None, offset=True, bounds=None, guess=None, method="lea
     {'a': 2.0, 'm': 1.0, 's': 0.5, 'c': 1.0}
     """
     x, y, w = _samples("gaussian", x, y, sigma)
-
-    def bell(x, p):
-        return np.exp(-0.5 * ((x - p[1]) / p[2])**2)
-
-    model, fixed = _with_offset(
-        offset, "a exp(-((x - m) / s)^2 / 2)", ["a", "m", "s"], lambda x, p: p[0] * bell(x, p),
-        lambda x, p: [bell(x, p), p[0] * bell(x, p) * (x - p[1]) / p[2]**2,
-                      p[0] * bell(x, p) * (x - p[1])**2 / p[2]**3])
     return _bounded("gaussian", lambda y, x, w, start, lower, upper, code: core.gaussian(
-        y, x, w, TOLERANCE, ITERATIONS, start, lower, upper, code)[2:6], model, x, y, w, bounds, guess, method, fixed)
+        y, x, w, TOLERANCE, ITERATIONS, start, lower, upper, code)[2:6], _gaussian(bool(offset)), x, y, w,
+        bounds, guess, method, {} if offset else {"c": 0.0})
 
 
 def linear(H, y, sigma=None, names=None):
@@ -600,14 +648,7 @@ def linear(H, y, sigma=None, names=None):
         refuse("fit.linear", "names", f"{H.shape[1]} are needed; {len(names)} came", "ErrSizesDisagree")
     _, y, w = _samples("linear", np.zeros(len(H)), y, sigma)
     p = core.linear(H, y, w, 0, 0)[0]
-    return _finished(_Rows(names), H, y, w, p)
-
-
-class _Rows(_Model):
-    """y = H c, whose x are rows."""
-
-    def __init__(self, names):
-        super().__init__("H c", names, lambda H, p: np.asarray(H, float) @ p, lambda H, p: np.asarray(H, float))
+    return _finished(_rows(tuple(names)), H, y, w, p)
 
 
 def curve(f, x, y, guess, sigma=None, bounds=None, absolute_sigma=False):
@@ -658,8 +699,7 @@ def curve(f, x, y, guess, sigma=None, bounds=None, absolute_sigma=False):
     x, y, w = _samples("curve", x, y, sigma)
     if len(x) < len(names):
         refuse("fit.curve", "x", f"at least {len(names)} samples are needed; {len(x)} came", "ErrFitPointsTooFew")
-    model = _Model(f"{getattr(f, '__name__', 'f')}(x, {', '.join(names)})", names,
-                   lambda x, p: np.asarray(f(x, *p), float) + np.zeros(np.shape(x)))
+    model = _any(f, tuple(names))
     lower, upper, p = _limits("curve", names, bounds, start, {})
     lower, upper = np.array(lower), np.array(upper)
     p = _marquardt(model, x, y, w, np.clip(p, lower, upper), lower, upper)

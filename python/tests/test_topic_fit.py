@@ -55,6 +55,9 @@ class Fits(unittest.TestCase):
                         close(found.values + found.residuals, y)
                         self.assertEqual(found.dof, 80 - len(p))
                         self.assertTrue(0.9 < found.r_square < 1)
+                        if "lambda" not in found.formula:
+                            again = pickle.loads(pickle.dumps(found))
+                            self.assertEqual(again.predict(1.5), found.predict(1.5))
                         close(found.predict([[0.5], [1.5]]), model(np.array([[0.5], [1.5]]), *p), 1e-12)
 
     def test_bands(self):

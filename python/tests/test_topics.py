@@ -75,7 +75,34 @@ class Names(unittest.TestCase):
                 self.assertEqual(doctest.testmod(module).failed, 0)
 
 
+def calls_of(work):
+    """How many Python functions a call enters."""
+    count = 0
+
+    def seen(frame, event, _):
+        nonlocal count
+        count += event == "call"
+
+    sys.setprofile(seen)
+    try:
+        work()
+    finally:
+        sys.setprofile(None)
+    return count
+
+
 class Axes(unittest.TestCase):
+    def test_one_channel_takes_the_short_way(self):
+        x = np.arange(10.0)
+        f = qx.filters.butterworth(4, 0.1)
+        for topical, export in ((lambda: qx.fft.hartley(x), lambda: qx.exports.FHTH(x)),
+                                (lambda: qx.fft.fft(x), lambda: qx.exports.ReOXFFTH(x)),
+                                (lambda: qx.stats.median(x), lambda: qx.exports.Median_head(x)),
+                                (lambda: qx.special.erf(0.5), lambda: qx.exports.QX_Erf(0.5)),
+                                (lambda: f(x), lambda: qx.exports.IIR_Filter2(x, 0, f._a, f._b, [], 0))):
+            topical(), export()  # written at the first call
+            self.assertLessEqual(calls_of(topical) - calls_of(export), 3)
+
     @hypothesis.given(strategies.lists(strategies.integers(1, 5), min_size=1, max_size=4), strategies.data())
     @hypothesis.settings(max_examples=60, deadline=None)
     def test_each_channel_has_the_bits_that_it_has_alone(self, shape, data):
