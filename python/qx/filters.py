@@ -91,6 +91,10 @@ class Filter:
         self._is_cascade, self.fs, self.title = is_cascade, float(fs), title
         self._main = main  # a frequency of the pass band, in cycles per sample
         self._rings = None  # _ringing(), once it is known
+        # The memory at rest: in its size a call makes no array for it.
+        sizes = [2 * (len(self._b) // 3)] if is_cascade else [max(len(self._b) - 1, 0), max(len(self._a) - 1, 0)]
+        self._rest = [np.zeros(size) for size in sizes]
+        self._rest_complex = [np.zeros(size, complex) for size in sizes]
 
     # Applying
 
@@ -118,13 +122,13 @@ class Filter:
 
     def _run(self, x):
         if self._is_cascade:
-            return core.Filter_cascade(x, 0, self._a, self._b, EMPTY, 0)[0]
-        return core.Filter_direct(x, self._a, self._b, EMPTY, EMPTY, 0)[0]
+            return core.Filter_cascade(x, 0, self._a, self._b, *self._rest, 0)[0]
+        return core.Filter_direct(x, self._a, self._b, *self._rest, 0)[0]
 
     def _run_complex(self, x):
         if self._is_cascade:
-            return core.Filter_cascade_complex(x, 0, self._a, self._b, EMPTY, 0)[0]
-        return core.Filter_direct_complex(x, self._a, self._b, EMPTY, EMPTY, 0)[0]
+            return core.Filter_cascade_complex(x, 0, self._a, self._b, *self._rest_complex, 0)[0]
+        return core.Filter_direct_complex(x, self._a, self._b, *self._rest_complex, 0)[0]
 
     def zero_phase(self, x, axis=LAST, extension="odd", pad=None):
         r"""The signal filtered forwards and backwards: no delay, the magnitude squared.
