@@ -21,7 +21,6 @@ __all__ = ["Bands", "Cycles", "Harmonics", "Levels", "PeakFinder", "Peaks", "Pul
 
 core = served("measure")
 
-EMPTY = np.empty(0)
 POLARITIES = {"rising": 1, "falling": 0}
 SLOPES = {"rising": 0, "falling": 1, "either": 2}
 LEVELS = {"histogram": 0, "peak": 1, "auto": 2}

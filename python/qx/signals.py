@@ -8,7 +8,7 @@ import math
 
 import numpy as np
 
-from .topical import LAST, along, chosen, count_of, either, refuse, served, vector, whole_number
+from .topical import LAST, along, chosen, refuse, served, vector, whole_number
 from .topical.axes import as_array
 
 __all__ = ["arbitrary", "autocorrelate", "chirp", "convolve", "convolve2", "correlate", "correlate2",

@@ -13,7 +13,6 @@ from hypothesis import strategies
 
 PYTHON = Path(__file__).resolve().parent.parent
 sys.path.insert(0, str(PYTHON))
-import qx  # noqa: E402
 from qx import multirate, noise, signals, spectra  # noqa: E402
 
 RNG = np.random.default_rng(7)
