@@ -35,12 +35,11 @@ void SeenHarmonics::lay(const Line &fundamental, int32_t n, int32_t highest) {
     const double halfBin = 0.5 / n;
     lines()[0] = fundamental;
     lines()[0].slope = 1;
-    lines()[0].group = 0;
     places()[0] = 0;
     count_ = 1;
     for (int32_t h = 1; h < highest; ++h) {
         const double turns = PartOfTurn(fundamental.frequency, h + 1.0);
-        Line seen = {std::fabs(turns), 0, 0, turns < 0 ? -(h + 1.0) : h + 1.0, 0};
+        Line seen = {std::fabs(turns), 0, 0, turns < 0 ? -(h + 1.0) : h + 1.0};
         places()[h] = -1;
         if (seen.frequency < halfBin)
             continue;
@@ -113,12 +112,12 @@ ErrorCode MeasureHarmonics(ToneSearch &search, const Line &fundamental, int32_t 
     if (const ErrorCode failed = seen.reserve(highest))
         return failed;
     seen.lay(fundamental, n, highest);
-    if (const ErrorCode failed = search.replace(seen.lines(), seen.count(), 1))
+    if (const ErrorCode failed = search.replace(seen.lines(), seen.count()))
         return failed;
 
     for (int32_t h = 0; h < highest; ++h) {
         const int32_t line = seen.lineOf(h);
-        harmonics[h] = line < 0 ? Line{kNaN, kNaN, kNaN, 0, 0} : search[line];
+        harmonics[h] = line < 0 ? Line{kNaN, kNaN, kNaN, 0} : search[line];
     }
     Scratch<ElementType::DBL> residual;
     if (const ErrorCode failed = residual.allocate(n))

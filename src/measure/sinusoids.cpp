@@ -7,6 +7,7 @@
 #include <algorithm>
 #include <cmath>
 #include <cstddef>
+#include <utility>
 
 namespace qx {
 namespace {
@@ -15,12 +16,7 @@ namespace {
 // s r sin.
 constexpr int32_t momentsOfLine = 4;
 
-// Sums over the record of cos(theta s), s sin(theta s) and s^2 cos(theta s), for theta of
-// 2 pi turns: the Dirichlet kernel and its derivatives.
-struct Kernel {
-    double cosines, sines, squares;
-};
-
+// For theta of 2 pi turns.
 Kernel SumDirectly(double turns, int32_t n) {
     Kernel sum = {0, 0, 0};
     const double middle = 0.5 * (n - 1);
@@ -35,6 +31,32 @@ Kernel SumDirectly(double turns, int32_t n) {
     return sum;
 }
 
+// Nearer to 0 the derivatives of the quotient lose their digits, and so near to each other are hardly
+// ever two lines.
+constexpr double nearZero = 0.05;
+
+// Of N(x) / sin x with x = theta / 2 and N(x) = sin(n x): first and second derivative by x.
+Kernel FromHalfAngle(Phasor x, Phasor nx, int32_t n) {
+    const double count = n;
+    const double slope = count * nx.cosine;
+    const double quotient = nx.sine / x.sine;
+    const double first = (slope - quotient * x.cosine) / x.sine;
+    const double second =
+        (-count * count * nx.sine - 2 * first * x.cosine + quotient * x.sine) / x.sine;
+    return {quotient, -0.5 * first, -0.25 * second};
+}
+
+Phasor PhasorOf(double turns, double count) {
+    const double angle = kTwoPi * PartOfTurn(turns, count);
+    return {std::cos(angle), std::sin(angle)};
+}
+Phasor Sum(Phasor a, Phasor b) {
+    return {a.cosine * b.cosine - a.sine * b.sine, a.sine * b.cosine + a.cosine * b.sine};
+}
+Phasor Difference(Phasor a, Phasor b) {
+    return {a.cosine * b.cosine + a.sine * b.sine, a.sine * b.cosine - a.cosine * b.sine};
+}
+
 // turns is from -1/2 to 1.
 Kernel KernelAt(double turns, int32_t n) {
     const double count = n;
@@ -46,22 +68,10 @@ Kernel KernelAt(double turns, int32_t n) {
         const double sign = n % 2 == 0 ? -1 : 1;
         return {sign * k.cosines, sign * k.sines, sign * k.squares};
     }
-    // Nearer to 0 the derivatives of the quotient lose their digits, and so near to each other are
-    // hardly ever two lines.
-    constexpr double nearZero = 0.05;
     if (std::fabs(turns) * count < nearZero)
         return SumDirectly(turns, n);
-    const double half = 0.5 * count;
-    const double over = kTwoPi * PartOfTurn(turns, half);
-    const double sine = std::sin(kPi * turns);
-    const double cosine = std::cos(kPi * turns);
-    // Of N(x) / sin x with x = theta / 2 and N(x) = sin(n x): first and second derivative by x.
-    const double top = std::sin(over);
-    const double slope = count * std::cos(over);
-    const double quotient = top / sine;
-    const double first = (slope - quotient * cosine) / sine;
-    const double second = (-count * count * top - 2 * first * cosine + quotient * sine) / sine;
-    return {quotient, -0.5 * first, -0.25 * second};
+    return FromHalfAngle({std::cos(kPi * turns), std::sin(kPi * turns)},
+                         PhasorOf(turns, 0.5 * count), n);
 }
 
 double Wrapped(double angle) {
@@ -91,16 +101,18 @@ void SinusoidFit::begin(const DBL *samples, int32_t n) {
     n_ = n;
 }
 
-ErrorCode SinusoidFit::reserve(int32_t lines, int32_t groups) {
+ErrorCode SinusoidFit::reserve(int32_t lines) {
     const int64_t count = lines;
-    const int64_t size = 1 + 2 * count + groups;
-    constexpr int64_t most = 1 << 14; // parameters; more have no memory in any case
-    if (size > most)
-        return ErrOutOfMemory;
+    const int64_t size = 2 + 3 * count;
+    const int64_t widest = 1 + 3 * (std::min<int64_t>(count, farthestReach) + 1);
+    const int64_t matrix = size * widest + size;
     const int64_t moments = 1 + momentsOfLine * count;
     const int64_t waves = 2 * waveBlock * count;
-    if (const ErrorCode failed =
-            memory_.allocate(2 * waves + 2 * size * size + 3 * size + 2 * moments))
+    if (const ErrorCode failed = memory_.allocate(2 * waves + 2 * matrix + 3 * size + 2 * moments))
+        return failed;
+    if (const ErrorCode failed = phasors_.allocate(4 * count * int64_t{sizeof(Phasor)}))
+        return failed;
+    if (const ErrorCode failed = order_.allocate(count))
         return failed;
     if (const ErrorCode failed = trialMemory_.allocate(count * int64_t{sizeof(Line)}))
         return failed;
@@ -112,28 +124,46 @@ ErrorCode SinusoidFit::reserve(int32_t lines, int32_t groups) {
     };
     waves_ = part(waves);
     table_ = part(waves);
-    normal_ = part(size * size);
-    factor_ = part(size * size);
+    normal_ = part(matrix);
+    factor_ = part(matrix);
     gradient_ = part(size);
     step_ = part(size);
     scale_ = part(size);
     moments_ = part(moments);
     trialMoments_ = part(moments);
     trial_ = static_cast<Line *>(trialMemory_.bytes());
+    atBlock_ = static_cast<Phasor *>(phasors_.bytes());
+    ofBlock_ = atBlock_ + lines;
+    halfAngles_ = ofBlock_ + lines;
     return 0;
 }
 
-// The phases of a block are those of its first sample, exact to the last bits however long the
-// record is, turned by those of 0, 1, ... from the table.
+// The waves of a block from phase 0, as products of two out of 14 phasors.
+void SinusoidFit::layTable(const Line &line, DBL *table) {
+    constexpr int32_t step = 8;
+    Phasor near[step], far[waveBlock / step];
+    for (int32_t j = 0; j < step; ++j)
+        near[j] = PhasorOf(line.frequency, j);
+    for (int32_t j = 0; j < waveBlock / step; ++j)
+        far[j] = PhasorOf(line.frequency, step * j);
+    for (int32_t j = 0; j < waveBlock; ++j) {
+        const Phasor at = Sum(far[j / step], near[j % step]);
+        table[j] = at.cosine;
+        table[waveBlock + j] = at.sine;
+    }
+}
+
+// The phases of a block are those of its first sample, turned by those of 0, 1, ... from the table.
+// Those of every 16th block are exact to the last bits, however long the record is, and the others
+// turned from block to block.
 double SinusoidFit::sumOfSquares(const Line *lines, int32_t count, double constant, DBL *moments,
                                  DBL *residual) {
     constexpr std::ptrdiff_t wave = 2 * waveBlock;
-    for (int32_t l = 0; l < count; ++l)
-        for (int32_t j = 0; j < waveBlock; ++j) {
-            const double angle = kTwoPi * PartOfTurn(lines[l].frequency, j);
-            table_[wave * l + j] = std::cos(angle);
-            table_[wave * l + waveBlock + j] = std::sin(angle);
-        }
+    constexpr std::ptrdiff_t turned = 16 * waveBlock;
+    for (int32_t l = 0; l < count; ++l) {
+        layTable(lines[l], table_ + wave * l);
+        ofBlock_[l] = PhasorOf(lines[l].frequency, waveBlock);
+    }
     if (moments != nullptr)
         Fill(moments, 1 + momentsOfLine * std::ptrdiff_t{count}, 0.0);
     double squares = 0;
@@ -145,9 +175,11 @@ double SinusoidFit::sumOfSquares(const Line *lines, int32_t count, double consta
         for (int32_t j = 0; j < length; ++j)
             left[j] = samples_[first + j] - constant;
         for (int32_t l = 0; l < count; ++l) {
-            const double angle = kTwoPi * PartOfTurn(lines[l].frequency, s0);
-            SubtractWave({std::cos(angle), std::sin(angle), lines[l].cosine, lines[l].sine},
-                         table_ + wave * l, waves_ + wave * l, left);
+            atBlock_[l] = first % turned == 0 ? PhasorOf(lines[l].frequency, s0)
+                                              : Sum(atBlock_[l], ofBlock_[l]);
+            SubtractWave(
+                {atBlock_[l].cosine, atBlock_[l].sine, lines[l].cosine, lines[l].sine},
+                table_ + wave * l, waves_ + wave * l, left);
         }
         Fill(left + length, waveBlock - length, 0.0);
         double ofBlock[2];
@@ -156,98 +188,142 @@ double SinusoidFit::sumOfSquares(const Line *lines, int32_t count, double consta
         if (residual != nullptr)
             for (int32_t j = 0; j < length; ++j)
                 residual[first + j] = left[j];
-        if (moments == nullptr)
-            continue;
-        moments[0] += ofBlock[0];
-        for (int32_t l = 0; l < count; ++l) {
-            double sums[4];
-            SumByWave(waves_ + wave * l, left, sums);
-            DBL *const m = moments + 1 + momentsOfLine * std::ptrdiff_t{l};
-            m[0] += sums[0];
-            m[1] += sums[1];
-            m[2] += s0 * sums[0] + sums[2];
-            m[3] += s0 * sums[1] + sums[3];
-        }
+        if (moments != nullptr)
+            addMoments(left, count, s0, ofBlock[0], moments);
     }
     return squares;
 }
 
-// The parameters: the constant, two of each line, one frequency of each group in units of
-// 1 / (pi n).
-void SinusoidFit::buildNormal(const Line *lines, int32_t count, int32_t groups) {
-    const std::ptrdiff_t size = 1 + 2 * std::ptrdiff_t{count} + groups;
-    Fill(normal_, size * size, 0.0);
-    const double unit = 2.0 / n_;
-    const auto at = [size](std::ptrdiff_t row, std::ptrdiff_t col) {
-        return std::max(row, col) * size + std::min(row, col);
-    };
-    normal_[at(0, 0)] = n_;
-    const std::ptrdiff_t firstGroup = 1 + 2 * std::ptrdiff_t{count};
-    for (int32_t l = 0; l < count; ++l) {
-        const Line &p = lines[l];
-        const Kernel alone = KernelAt(p.frequency, n_);
-        normal_[at(0, 1 + 2 * l)] = alone.cosines;
-        normal_[at(0, firstGroup + p.group)] -= p.slope * unit * p.cosine * alone.sines;
-        for (int32_t m = 0; m <= l; ++m) {
-            const Line &q = lines[m];
-            const Kernel less = KernelAt(std::fabs(p.frequency - q.frequency), n_);
-            const Kernel more = KernelAt(p.frequency + q.frequency, n_);
-            normal_[at(1 + 2 * l, 1 + 2 * m)] = 0.5 * (less.cosines + more.cosines);
-            normal_[at(2 + 2 * l, 2 + 2 * m)] = 0.5 * (less.cosines - more.cosines);
-            // s sin(p) cos(q) and s cos(p) sin(q); the kernel's sines are odd.
-            const double difference = p.frequency < q.frequency ? -less.sines : less.sines;
-            const double ofSine = 0.5 * (more.sines + difference);
-            const double ofCosine = 0.5 * (more.sines - difference);
-            const double toP = p.slope * unit;
-            const double toQ = q.slope * unit;
-            normal_[at(firstGroup + q.group, 1 + 2 * l)] -= toQ * q.cosine * ofCosine;
-            normal_[at(firstGroup + q.group, 2 + 2 * l)] += toQ * q.sine * ofSine;
-            const double both = toP * toQ * 0.5 *
-                                (p.cosine * q.cosine * (less.squares - more.squares) +
-                                 p.sine * q.sine * (less.squares + more.squares));
-            normal_[at(firstGroup + p.group, firstGroup + q.group)] += both;
-            if (m == l)
-                continue;
-            normal_[at(firstGroup + p.group, 1 + 2 * m)] -= toP * p.cosine * ofSine;
-            normal_[at(firstGroup + p.group, 2 + 2 * m)] += toP * p.sine * ofCosine;
-            if (p.group == q.group)
-                normal_[at(firstGroup + p.group, firstGroup + q.group)] += both;
-        }
+// Of a block whose waves are at hand.
+void SinusoidFit::addMoments(const DBL *left, int32_t count, double s0, double sum, DBL *moments) {
+    moments[0] += sum;
+    for (std::ptrdiff_t l = 0; l < count; ++l) {
+        double sums[4];
+        SumByWave(waves_ + 2 * waveBlock * l, left, sums);
+        DBL *const m = moments + 1 + momentsOfLine * l;
+        m[0] += sums[0];
+        m[1] += sums[1];
+        m[2] += s0 * sums[0] + sums[2];
+        m[3] += s0 * sums[1] + sums[3];
     }
 }
 
-void SinusoidFit::buildGradient(const Line *lines, int32_t count, int32_t groups,
-                                const DBL *moments) {
-    const std::ptrdiff_t firstGroup = 1 + 2 * std::ptrdiff_t{count};
-    Fill(gradient_, firstGroup + groups, 0.0);
-    gradient_[0] = moments[0];
-    for (std::ptrdiff_t l = 0; l < count; ++l) {
-        const DBL *const m = moments + 1 + momentsOfLine * l;
-        gradient_[1 + 2 * l] = m[0];
-        gradient_[2 + 2 * l] = m[1];
-        gradient_[firstGroup + lines[l].group] +=
+// The order of the step before is nearly right.
+void SinusoidFit::sortByFrequency(const Line *lines) {
+    for (int32_t i = 1; i < layout_.count; ++i) {
+        const int32_t moved = order_[i];
+        int32_t at = i;
+        for (; at > 0 && lines[moved].frequency < lines[order_[at - 1]].frequency; --at)
+            order_[at] = order_[at - 1];
+        order_[at] = moved;
+    }
+}
+
+void SinusoidFit::buildNormal(const Line *lines) {
+    const std::ptrdiff_t size = layout_.size();
+    for (std::ptrdiff_t row = 0; row < size; ++row) {
+        const std::ptrdiff_t first = layout_.firstInRow(row);
+        Fill(layout_.row(normal_, row) + first, row - first + 1, 0.0);
+    }
+    layout_.row(normal_, 0)[0] = n_;
+    for (int32_t l = 0; l < layout_.count; ++l) {
+        halfAngles_[2 * std::ptrdiff_t{l}] = PhasorOf(lines[l].frequency, 0.5);
+        halfAngles_[2 * std::ptrdiff_t{l} + 1] = PhasorOf(lines[l].frequency, 0.5 * n_);
+    }
+    const double unit = 2.0 / n_;
+    for (int32_t place = 0; place < layout_.count; ++place) {
+        const Line &p = lines[order_[place]];
+        if (place < layout_.reach) {
+            const Kernel alone = KernelAt(p.frequency, n_);
+            const double weight = layout_.weight(place + 1);
+            layout_.row(normal_, layout_.ofPlace(place))[0] = weight * alone.cosines;
+            layout_.row(normal_, layout_.frequencyOf(place))[0] -=
+                weight * p.slope * unit * p.cosine * alone.sines;
+        }
+        for (int32_t other = std::max(0, place - layout_.reach); other <= place; ++other)
+            addProducts(lines, place, other);
+    }
+}
+
+// The kernels of the difference and of the sum of the frequencies of two lines, of which p has the
+// higher one.
+void SinusoidFit::kernelsOf(const Line *lines, int32_t p, int32_t q, Kernel &less,
+                            Kernel &more) const {
+    const Phasor *const ofP = halfAngles_ + 2 * std::ptrdiff_t{p};
+    const Phasor *const ofQ = halfAngles_ + 2 * std::ptrdiff_t{q};
+    const double difference = lines[p].frequency - lines[q].frequency;
+    const double sum = lines[p].frequency + lines[q].frequency;
+    less = difference * n_ < nearZero ? KernelAt(difference, n_)
+                                      : FromHalfAngle(Difference(ofP[0], ofQ[0]),
+                                                      Difference(ofP[1], ofQ[1]), n_);
+    more = (1 - sum) * n_ < nearZero
+               ? KernelAt(sum, n_)
+               : FromHalfAngle(Sum(ofP[0], ofQ[0]), Sum(ofP[1], ofQ[1]), n_);
+}
+
+// Of the derivatives by the parameters of two lines, in the order of their frequencies.
+void SinusoidFit::addProducts(const Line *lines, int32_t placeOfP, int32_t placeOfQ) {
+    const Line &p = lines[order_[placeOfP]], &q = lines[order_[placeOfQ]];
+    const std::ptrdiff_t ofP = layout_.ofPlace(placeOfP), ofQ = layout_.ofPlace(placeOfQ);
+    const std::ptrdiff_t frequencyOfP = layout_.frequencyOf(placeOfP);
+    const std::ptrdiff_t frequencyOfQ = layout_.frequencyOf(placeOfQ);
+    const auto add = [this](std::ptrdiff_t a, std::ptrdiff_t b, double product) {
+        layout_.row(normal_, std::max(a, b))[std::min(a, b)] += product;
+    };
+    const double weight = layout_.weight(placeOfP - placeOfQ);
+    Kernel less, more;
+    kernelsOf(lines, order_[placeOfP], order_[placeOfQ], less, more);
+    const double half = 0.5 * weight;
+    add(ofP, ofQ, half * (less.cosines + more.cosines));
+    add(ofP + 1, ofQ + 1, half * (less.cosines - more.cosines));
+    // s sin(p) cos(q) and s cos(p) sin(q); the kernel's sines are odd.
+    const double ofSine = half * (more.sines + less.sines);
+    const double ofCosine = half * (more.sines - less.sines);
+    const double toP = p.slope * (2.0 / n_);
+    const double toQ = q.slope * (2.0 / n_);
+    add(frequencyOfP, ofQ, -toP * p.cosine * ofSine);
+    add(frequencyOfP, ofQ + 1, toP * p.sine * ofCosine);
+    const double both = toP * toQ * half *
+                        (p.cosine * q.cosine * (less.squares - more.squares) +
+                         p.sine * q.sine * (less.squares + more.squares));
+    add(frequencyOfP, frequencyOfQ, both);
+    if (placeOfP == placeOfQ)
+        return;
+    add(frequencyOfQ, ofP, -toQ * q.cosine * ofCosine);
+    add(frequencyOfQ, ofP + 1, toQ * q.sine * ofSine);
+    if (frequencyOfP == frequencyOfQ)
+        add(frequencyOfP, frequencyOfQ, both);
+}
+
+void SinusoidFit::buildGradient(const Line *lines) {
+    Fill(gradient_, layout_.size(), 0.0);
+    gradient_[0] = moments_[0];
+    for (std::ptrdiff_t place = 0; place < layout_.count; ++place) {
+        const int32_t l = order_[place];
+        const DBL *const m = moments_ + 1 + momentsOfLine * std::ptrdiff_t{l};
+        gradient_[layout_.ofPlace(place)] = m[0];
+        gradient_[layout_.ofPlace(place) + 1] = m[1];
+        gradient_[layout_.frequencyOf(place)] +=
             lines[l].slope * (2.0 / n_) * (lines[l].sine * m[2] - lines[l].cosine * m[3]);
     }
 }
 
 // Cholesky's method on the matrix scaled to a diagonal of 1 + damping. A parameter on which nothing
 // depends, such as the frequency of a line without amplitude, stays.
-bool SinusoidFit::solve(int32_t size, double damping) {
+bool SinusoidFit::factor(double damping) {
     constexpr double nothing = 1e-40; // of the number of samples
-    const std::ptrdiff_t n = size;
-    for (std::ptrdiff_t i = 0; i < n; ++i) {
-        const double diagonal = normal_[i * n + i];
-        scale_[i] = diagonal > nothing * n_ ? 1 / std::sqrt(diagonal) : 0.0;
-    }
-    for (std::ptrdiff_t i = 0; i < n; ++i) {
-        DBL *const row = factor_ + i * n;
-        for (std::ptrdiff_t j = 0; j <= i; ++j) {
-            const DBL *const other = factor_ + j * n;
-            double sum = scale_[i] * normal_[i * n + j] * scale_[j];
+    for (std::ptrdiff_t i = 0; i < layout_.size(); ++i) {
+        const DBL *const normal = layout_.row(normal_, i);
+        DBL *const row = layout_.row(factor_, i);
+        scale_[i] = normal[i] > nothing * n_ ? 1 / std::sqrt(normal[i]) : 0.0;
+        const std::ptrdiff_t first = layout_.firstInRow(i);
+        for (std::ptrdiff_t j = first; j <= i; ++j) {
+            const DBL *const other = layout_.row(factor_, j);
+            const std::ptrdiff_t from = std::max(first, layout_.firstInRow(j));
+            double sum = scale_[i] * normal[j] * scale_[j];
             if (i == j)
                 sum = scale_[i] > 0 ? 1 + damping : 1;
-            for (std::ptrdiff_t k = 0; k < j; ++k)
-                sum -= row[k] * other[k];
+            sum -= SumOfProducts(row + from, other + from, static_cast<int32_t>(j - from));
             if (i != j)
                 row[j] = sum / other[j];
             else if (sum > 1e-15)
@@ -255,39 +331,51 @@ bool SinusoidFit::solve(int32_t size, double damping) {
             else
                 return false;
         }
-        double sum = scale_[i] * gradient_[i];
-        for (std::ptrdiff_t k = 0; k < i; ++k)
-            sum -= row[k] * step_[k];
-        step_[i] = sum / row[i];
+    }
+    return true;
+}
+
+// The step by the factored matrix, and by how much a linear model would lower the sum of squares.
+double SinusoidFit::solve() {
+    const std::ptrdiff_t n = layout_.size();
+    for (std::ptrdiff_t i = 0; i < n; ++i) {
+        const DBL *const row = layout_.row(factor_, i);
+        const std::ptrdiff_t first = layout_.firstInRow(i);
+        const double known =
+            SumOfProducts(row + first, step_ + first, static_cast<int32_t>(i - first));
+        step_[i] = (scale_[i] * gradient_[i] - known) / row[i];
     }
     for (std::ptrdiff_t i = n - 1; i >= 0; --i) {
-        double sum = step_[i];
-        for (std::ptrdiff_t k = i + 1; k < n; ++k)
-            sum -= factor_[k * n + i] * step_[k];
-        step_[i] = sum / factor_[i * n + i];
+        const DBL *const row = layout_.row(factor_, i);
+        step_[i] /= row[i];
+        for (std::ptrdiff_t k = layout_.firstInRow(i); k < i; ++k)
+            step_[k] -= row[k] * step_[i];
     }
-    for (std::ptrdiff_t i = 0; i < n; ++i)
+    double promised = 0;
+    for (std::ptrdiff_t i = 0; i < n; ++i) {
         step_[i] *= scale_[i];
-    return true;
+        promised += step_[i] * gradient_[i];
+    }
+    return promised;
 }
 
 // False where a frequency leaves what a record of this length tells from 0 and from half the
 // sampling rate.
-bool SinusoidFit::takeStep(const Line *from, int32_t count, int32_t groups, Line *to) {
-    const DBL *const ofGroups = step_ + 1 + 2 * std::ptrdiff_t{count};
+bool SinusoidFit::takeStep(const Line *from, Line *to) {
     double widest = 0;
-    for (int32_t g = 0; g < groups; ++g)
-        widest = std::max(widest, std::fabs(ofGroups[g]));
+    for (std::ptrdiff_t place = 0; place < layout_.count; ++place)
+        widest = std::max(widest, std::fabs(step_[layout_.frequencyOf(place)]));
     if (widest > kPi) // a bin at most
-        for (std::ptrdiff_t i = 0; i < 1 + 2 * std::ptrdiff_t{count} + groups; ++i)
+        for (std::ptrdiff_t i = 0; i < layout_.size(); ++i)
             step_[i] *= kPi / widest;
-    for (std::ptrdiff_t l = 0; l < count; ++l) {
+    for (std::ptrdiff_t place = 0; place < layout_.count; ++place) {
+        const int32_t l = order_[place];
         to[l] = from[l];
-        to[l].cosine += step_[1 + 2 * l];
-        to[l].sine += step_[2 + 2 * l];
+        to[l].cosine += step_[layout_.ofPlace(place)];
+        to[l].sine += step_[layout_.ofPlace(place) + 1];
         if (from[l].slope == 0)
             continue;
-        to[l].frequency += from[l].slope * ofGroups[from[l].group] / (kPi * n_);
+        to[l].frequency += from[l].slope * step_[layout_.frequencyOf(place)] / (kPi * n_);
         if (!(to[l].frequency >= smallestFrequency() &&
               to[l].frequency <= 0.5 - smallestFrequency()))
             return false;
@@ -295,28 +383,29 @@ bool SinusoidFit::takeStep(const Line *from, int32_t count, int32_t groups, Line
     return true;
 }
 
-double SinusoidFit::refine(Line *lines, int32_t count, int32_t groups, double settled,
-                           double &constant) {
-    constexpr int32_t mostSteps = 100;
+double SinusoidFit::refine(Line *lines, int32_t count, Frequencies frequencies,
+                           const FitEffort &effort, double &constant) {
     constexpr double mostDamping = 1e6;
     constexpr double firstDamping = 1e-3;
     constexpr double rounding = 1e-27; // of the samples' own squares
 
-    const int32_t size = 1 + 2 * count + groups;
+    layout_ = {count, frequencies, std::min(effort.reach, count)};
+    for (int32_t l = 0; l < count; ++l)
+        order_[l] = l;
     double squares = sumOfSquares(lines, count, constant, moments_, nullptr);
     double damping = 0;
-    for (int32_t k = 0; k < mostSteps && squares > 0; ++k) {
-        buildNormal(lines, count, groups);
-        buildGradient(lines, count, groups, moments_);
-        double promised = 0;
+    for (int32_t k = 0; k < effort.mostSteps && squares > 0; ++k) {
+        sortByFrequency(lines);
+        buildNormal(lines);
+        buildGradient(lines);
         for (;;) {
             double trialSquares = kInfinity;
-            promised = kInfinity;
-            if (solve(size, damping)) {
-                promised = 0;
-                for (int32_t i = 0; i < size; ++i)
-                    promised += step_[i] * gradient_[i];
-                if (takeStep(lines, count, groups, trial_))
+            double promised = kInfinity;
+            if (factor(damping)) {
+                promised = solve();
+                if (damping == 0 && promised <= effort.settled * squares)
+                    return squares;
+                if (takeStep(lines, trial_))
                     trialSquares =
                         sumOfSquares(trial_, count, constant + step_[0], trialMoments_, nullptr);
             }
@@ -330,12 +419,8 @@ double SinusoidFit::refine(Line *lines, int32_t count, int32_t groups, double se
         }
         std::copy(trial_, trial_ + count, lines);
         constant += step_[0];
-        DBL *const accepted = trialMoments_;
-        trialMoments_ = moments_;
-        moments_ = accepted;
+        std::swap(moments_, trialMoments_);
         damping = damping > firstDamping ? damping / 10 : 0;
-        if (promised <= settled * squares && damping == 0)
-            break;
     }
     return squares;
 }

@@ -4,22 +4,32 @@
 #include "frame/scratch.h"
 #include "qx/types.h"
 
+#include <cstddef>
 #include <cstdint>
 
 namespace qx {
 
 // A line of a record of n samples: cosine cos(2 pi frequency s) + sine sin(2 pi frequency s), with
 // s the sample number counted from the middle of the record, (n - 1) / 2, and the frequency in
-// cycles per sample.
-//
-// The lines of a group move together: where the group's frequency changes by d, that of a line
-// changes by slope d. Tones have a group each and slope 1, harmonics are one group.
+// cycles per sample. Where lines have one frequency in common that changes by d, that of the line
+// changes by slope d.
 struct Line {
     DBL frequency;
     DBL cosine, sine;
     DBL slope;
-    I32 group;
 };
+
+struct Phasor {
+    DBL cosine, sine;
+};
+// Sums over the record of cos(theta s), s sin(theta s) and s^2 cos(theta s): the Dirichlet kernel and
+// its derivatives.
+struct Kernel {
+    double cosines, sines, squares;
+};
+
+// Of the lines of a fit: each has its own, as tones have, or all have one, as harmonics have.
+enum class Frequencies { Own, Common };
 
 double Amplitude(const Line &line);
 // The phase of the line as a cosine at the first of n samples, above -pi and at most pi.
@@ -28,44 +38,99 @@ double PhaseAtStart(const Line &line, int32_t n);
 // value count - its nearest integer; count is a multiple of 1/2.
 double PartOfTurn(double value, double count);
 
+// How far a fit goes. It ends before a step that would take less than the part `settled` of the sum
+// of squares, or after mostSteps. The matrix of a step leaves out what lines more than `reach` places
+// apart in the order of their frequencies have in common, which makes the steps less good, not the
+// fit.
+struct FitEffort {
+    double settled;
+    int32_t mostSteps;
+    int32_t reach; // at most SinusoidFit::farthestReach
+};
+
 // A constant and lines, fitted to samples by least squares: the sine fit of IEEE 1057 extended to
 // several lines. Damped Gauss-Newton steps (D. W. Marquardt, 1963) in all parameters at once; the
 // products of the derivatives with each other have closed forms, so that a step takes time in
 // proportion to samples times lines.
 class SinusoidFit {
 public:
+    static constexpr int32_t farthestReach = 32;
+
     // Samples of magnitude about 1 that stay where they are.
     void begin(const DBL *samples, int32_t n);
 
-    // Memory for so many lines in so many groups, of which the rest of the calls may have fewer.
-    // ErrOutOfMemory.
-    ErrorCode reserve(int32_t lines, int32_t groups);
+    // Memory for so many lines, of which the rest of the calls may have fewer. ErrOutOfMemory.
+    ErrorCode reserve(int32_t lines);
 
-    // Moves the lines and the constant from where they are to the least squares nearby, until a
-    // step takes less than the part `settled` of the sum of squares. What is left of that.
-    double refine(Line *lines, int32_t count, int32_t groups, double settled, double &constant);
+    // Moves the lines and the constant from where they are to the least squares nearby. What is left
+    // of the sum of squares.
+    double refine(Line *lines, int32_t count, Frequencies frequencies, const FitEffort &effort,
+                  double &constant);
 
-    // What is left of the samples, and the sum of its squares; residual may be null.
+    // What is left of the samples, and the sum of its squares; residual may be null, or the samples.
     double residualOf(const Line *lines, int32_t count, double constant, DBL *residual);
 
 private:
+    // The parameters are the constant, then cosine, sine and, unless it is in common, frequency of
+    // each line in the order of the frequencies, and last the common frequency. Frequencies are in
+    // units of 1 / (pi n). Of the symmetric matrix of their products the rows of the lower triangle
+    // are kept from the first line within reach on, that of the common frequency as a whole.
+    struct Layout {
+        int32_t count;
+        Frequencies frequencies;
+        int32_t reach;
+
+        std::ptrdiff_t perLine() const { return frequencies == Frequencies::Own ? 3 : 2; }
+        std::ptrdiff_t common() const { return 1 + perLine() * count; }
+        std::ptrdiff_t size() const { return common() + (frequencies == Frequencies::Common); }
+        std::ptrdiff_t ofPlace(std::ptrdiff_t place) const { return 1 + perLine() * place; }
+        std::ptrdiff_t frequencyOf(std::ptrdiff_t place) const {
+            return frequencies == Frequencies::Own ? ofPlace(place) + 2 : common();
+        }
+        std::ptrdiff_t firstInRow(std::ptrdiff_t row) const {
+            const std::ptrdiff_t place = (row - 1) / perLine();
+            return row == 0 || row == common() || place < reach ? 0 : ofPlace(place - reach);
+        }
+        std::ptrdiff_t width() const { return 1 + perLine() * (std::ptrdiff_t{reach} + 1); }
+        // Where the row begins; element (row, col) is col places on.
+        DBL *row(DBL *matrix, std::ptrdiff_t row) const {
+            return matrix + row * width() - firstInRow(row);
+        }
+        // Of the products of lines so many places apart: 1, or weights that fall to 0 beyond the reach
+        // and so leave the matrix positive (I. Schur, 1911).
+        double weight(std::ptrdiff_t apart) const {
+            return count <= reach ? 1.0 : 1.0 - static_cast<double>(apart) / (reach + 1.0);
+        }
+    };
+
     double middle() const { return 0.5 * (n_ - 1); }
     double smallestFrequency() const { return 0.25 / n_; }
     double sumOfSquares(const Line *lines, int32_t count, double constant, DBL *moments,
                         DBL *residual);
-    void buildNormal(const Line *lines, int32_t count, int32_t groups);
-    void buildGradient(const Line *lines, int32_t count, int32_t groups, const DBL *moments);
-    bool solve(int32_t size, double damping);
-    bool takeStep(const Line *from, int32_t count, int32_t groups, Line *to);
+    void layTable(const Line &line, DBL *table);
+    void addMoments(const DBL *left, int32_t count, double s0, double sum, DBL *moments);
+    void sortByFrequency(const Line *lines);
+    void buildNormal(const Line *lines);
+    void kernelsOf(const Line *lines, int32_t p, int32_t q, Kernel &less, Kernel &more) const;
+    void addProducts(const Line *lines, int32_t placeOfP, int32_t placeOfQ);
+    void buildGradient(const Line *lines);
+    bool factor(double damping);
+    double solve();
+    bool takeStep(const Line *from, Line *to);
 
     const DBL *samples_ = nullptr;
     int32_t n_ = 0;
+    Layout layout_ = {};
     Scratch<ElementType::DBL> memory_;
-    ScratchBytes trialMemory_;
+    Scratch<ElementType::I32> order_; // the lines by rising frequency
+    ScratchBytes trialMemory_, phasors_;
+    // By line: at the first sample of the block at hand, of a block, and two of half the angle of a
+    // sample and of all.
+    Phasor *atBlock_ = nullptr, *ofBlock_ = nullptr, *halfAngles_ = nullptr;
     // Of the block at hand, by line: cosines and sines; and those of a wave from
     // phase 0.
     DBL *waves_ = nullptr, *table_ = nullptr;
-    DBL *normal_ = nullptr, *factor_ = nullptr; // size by size, the lower triangles
+    DBL *normal_ = nullptr, *factor_ = nullptr;
     DBL *gradient_ = nullptr, *step_ = nullptr, *scale_ = nullptr;
     DBL *moments_ = nullptr, *trialMoments_ = nullptr;
     Line *trial_ = nullptr;

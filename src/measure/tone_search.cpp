@@ -16,13 +16,11 @@ namespace {
 // Lines below this part of the largest tone are rounding.
 constexpr double smallestPart = 1e-12;
 
-// How far fits settle: while tones are still sought, what is off must not be seen as a line; in the
-// end it must be far below what noise does.
-constexpr double settledForSearch = 1e-6;
-constexpr double settledForGood = 1e-15;
-
-// A von Hann window without zeros at its ends.
-double Window(int32_t t, int32_t n) { return 0.5 - 0.5 * std::cos(kTwoPi * (t + 0.5) / n); }
+// How far fits go: while tones are still sought, what is off must not be seen as a line; in the end it
+// must be far below what noise does. The bounds of the steps are for records that are no tones.
+constexpr FitEffort nearby = {1e-6, 20, SinusoidFit::farthestReach};
+constexpr FitEffort searching = {1e-6, 3, 12};
+constexpr FitEffort forGood = {1e-20, 100, SinusoidFit::farthestReach};
 
 // The vertex of the parabola through three neighbours, of which the second is the largest, from
 // that.
@@ -66,14 +64,14 @@ ErrorCode ToneSearch::begin(const DBL *y, int32_t n) {
     return 0;
 }
 
-ErrorCode ToneSearch::reserve(int32_t count, int32_t groups) {
-    if (const ErrorCode failed = fit_.reserve(count, groups))
-        return failed;
+ErrorCode ToneSearch::reserve(int32_t count) {
     if (count <= capacity_)
         return 0;
     const int32_t capacity = std::max(count, 2 * capacity_);
+    if (const ErrorCode failed = fit_.reserve(std::max(capacity, mostNearby + 1)))
+        return failed;
     ScratchBytes grown;
-    if (const ErrorCode failed = grown.allocate(3 * int64_t{capacity} * int64_t{sizeof(Line)}))
+    if (const ErrorCode failed = grown.allocate(2 * int64_t{capacity} * int64_t{sizeof(Line)}))
         return failed;
     if (count_ > 0)
         std::copy(lines(), lines() + count_, static_cast<Line *>(grown.bytes()));
@@ -82,40 +80,72 @@ ErrorCode ToneSearch::reserve(int32_t count, int32_t groups) {
     return 0;
 }
 
-// The spectrum of the windowed residual, at half a bin or less.
-ErrorCode ToneSearch::largestLine(const Band &band, Peak &peak) {
+// The spectrum is at half a bin or less.
+ErrorCode ToneSearch::reserveSpectrum() {
+    if (spectrumLength_ > 0)
+        return 0;
     constexpr int64_t fewest = 64;
     const auto length = static_cast<int64_t>(
         std::bit_ceil(static_cast<uint64_t>(std::max(fewest, 2 * int64_t{n_}))));
     if (length > std::numeric_limits<int32_t>::max() / int64_t{sizeof(DBL)})
         return ErrOutOfMemory;
-    const auto m = static_cast<int32_t>(length);
-    Scratch<ElementType::DBL> work, spectrum;
-    for (Scratch<ElementType::DBL> *memory : {&work, &spectrum})
-        if (const ErrorCode failed = memory->allocate(m))
+    for (Scratch<ElementType::DBL> *memory : {&residual_, &window_})
+        if (const ErrorCode failed = memory->allocate(n_))
             return failed;
-    fit_.residualOf(lines(), count_, constant_, work.data());
-    double gain = 0;
-    for (int32_t t = 0; t < n_; ++t) {
-        const double weight = Window(t, n_);
-        gain += weight;
-        work[t] *= weight;
-    }
-    Fill(work.data() + n_, m - n_, 0.0);
-    if (!plan_)
-        plan_.emplace(m);
+    for (Scratch<ElementType::DBL> *memory : {&work_, &spectrum_})
+        if (const ErrorCode failed = memory->allocate(length))
+            return failed;
+    plan_.emplace(static_cast<int32_t>(length));
     if (!*plan_)
         return ErrOutOfMemory;
+    spectrumLength_ = static_cast<int32_t>(length);
+
+    // Von Hann's, without zeros at its ends: what 0 leaves of its negative.
+    const Line wave = {1.0 / n_, -0.5, 0, 0};
+    Fill(window_.data(), n_, 0.0);
+    SinusoidFit window;
+    if (const ErrorCode failed = window.reserve(1))
+        return failed;
+    window.begin(window_.data(), n_);
+    window.residualOf(&wave, 1, -0.5, window_.data());
+    return 0;
+}
+
+// The mean power of noise: its powers have an exponential distribution, whose median is ln 2 of its
+// mean. The powers are spoiled; of many, some thousands do.
+double ToneSearch::noiseOf(const DBL *power, int32_t count) {
+    constexpr double medianOfMean = 0.6931471805599453;
+    constexpr int32_t enough = 1 << 15;
+    const int32_t every = std::max(1, count / enough);
+    const int32_t taken = count / every;
+    for (int32_t k = 0; k < taken; ++k)
+        spectrum_[k] = power[std::ptrdiff_t{k} * every];
+    SelectKth(spectrum_.data(), taken, taken / 2);
+    return spectrum_[taken / 2] / medianOfMean;
+}
+
+// The spectrum of the windowed residual, which stays in residual_.
+ErrorCode ToneSearch::largestLine(const Band &band, Peak &peak) {
+    if (const ErrorCode failed = reserveSpectrum())
+        return failed;
+    const int32_t m = spectrumLength_;
+    fit_.residualOf(lines(), count_, constant_, residual_.data());
+    double gain = 0;
+    for (int32_t t = 0; t < n_; ++t) {
+        gain += window_[t];
+        work_[t] = window_[t] * residual_[t];
+    }
+    Fill(work_.data() + n_, m - n_, 0.0);
     if (const ErrorCode failed =
-            FFTRealForward(plan_->get(), work.data(), spectrum.data(), 1, 1, m))
+            FFTRealForward(plan_->get(), work_.data(), spectrum_.data(), 1, 1, m))
         return failed;
 
-    DBL *const power = work.data();
+    DBL *const power = work_.data();
     const int32_t half = m / 2;
-    power[0] = spectrum[0] * spectrum[0];
-    power[half] = spectrum[half] * spectrum[half];
+    power[0] = spectrum_[0] * spectrum_[0];
+    power[half] = spectrum_[half] * spectrum_[half];
     for (int32_t k = 1; k < half; ++k)
-        power[k] = spectrum[k] * spectrum[k] + spectrum[m - k] * spectrum[m - k];
+        power[k] = spectrum_[k] * spectrum_[k] + spectrum_[m - k] * spectrum_[m - k];
     peak = {0, 0, 0};
     const auto from = static_cast<int32_t>(std::clamp(std::ceil(band.low * m), 1.0, half + 0.0));
     const auto to = static_cast<int32_t>(std::clamp(std::floor(band.high * m), 0.0, half - 1.0));
@@ -131,31 +161,77 @@ ErrorCode ToneSearch::largestLine(const Band &band, Peak &peak) {
     const double inside = 0.5 / n_;
     peak.frequency = std::clamp((highest + shift) / m, inside, 0.5 - inside);
     peak.amplitude = 2 * std::sqrt(height) / gain;
-    // The powers of noise have an exponential distribution, whose median is ln 2 of its mean.
-    constexpr double medianOfMean = 0.6931471805599453;
-    SelectKth(power + 1, half - 1, half / 2);
-    const double noise = power[1 + half / 2] / medianOfMean;
+    const double noise = noiseOf(power + 1, half - 1);
     peak.overNoise = noise > 0 ? height / noise : kInfinity;
     return 0;
 }
 
+// What a rectangular window lets through from farther away is left to the fit of all.
+ToneSearch::Neighbourhood ToneSearch::linesAround(double frequency) const {
+    constexpr double farthest = 16; // bins
+    Neighbourhood around;
+    around.count = 0;
+    const auto distance = [&](int32_t l) { return std::fabs(lines()[l].frequency - frequency); };
+    for (int32_t l = 0; l < count_; ++l) {
+        if (distance(l) * n_ > farthest)
+            continue;
+        int32_t at = std::min(around.count, mostNearby);
+        for (; at > 0 && distance(l) < distance(around.places[at - 1]); --at)
+            if (at < mostNearby)
+                around.places[at] = around.places[at - 1];
+        if (at < mostNearby)
+            around.places[at] = l;
+        around.count = std::min(around.count + 1, mostNearby);
+    }
+    for (int32_t i = 0; i < around.count; ++i)
+        around.lines[i] = lines()[around.places[i]];
+    around.constant = 0;
+    around.squares = squares_;
+    return around;
+}
+
 // One start of the fit: a new line at `frequency` without amplitude, and where `split` is one of
-// the others, that moved to the other side. The best result so far is kept in best().
-void ToneSearch::fitFrom(double frequency, int32_t split, double offset, State &least) {
-    std::copy(former(), former() + count_, lines());
-    lines()[count_] = {frequency, 0, 0, 1, count_};
+// the others, that moved to the other side. The best result so far is kept in `least`.
+void ToneSearch::fitFrom(const Neighbourhood &around, double frequency, int32_t split,
+                         double offset, Neighbourhood &least) {
+    Neighbourhood trial = around;
+    trial.lines[around.count] = {frequency, 0, 0, 1};
     if (split >= 0) {
         if (frequency <= std::fabs(offset) || frequency >= 0.5 - std::fabs(offset))
             return;
-        lines()[count_].frequency = frequency + offset;
-        lines()[split].frequency = frequency - offset;
+        trial.lines[around.count].frequency = frequency + offset;
+        trial.lines[split].frequency = frequency - offset;
     }
-    double constant = constant_;
-    const double squares = fit_.refine(lines(), count_ + 1, count_ + 1, settledForSearch, constant);
-    if (!(squares < least.squares))
-        return;
-    least = {constant, squares};
-    std::copy(lines(), lines() + count_ + 1, best());
+    ++trial.count;
+    trial.squares =
+        fit_.refine(trial.lines, trial.count, Frequencies::Own, nearby, trial.constant);
+    if (trial.squares < least.squares)
+        least = trial;
+}
+
+// Fits a new line to what the lines that are not around it leave.
+ToneSearch::Neighbourhood ToneSearch::fitNearby(const Neighbourhood &around, double frequency) {
+    Line negatives[mostNearby];
+    for (int32_t i = 0; i < around.count; ++i) {
+        negatives[i] = around.lines[i];
+        negatives[i].cosine *= -1;
+        negatives[i].sine *= -1;
+    }
+    fit_.begin(residual_.data(), n_);
+    fit_.residualOf(negatives, around.count, 0, residual_.data());
+    Neighbourhood least = around;
+    fitFrom(around, frequency, -1, 0, least);
+    // A line near it may stand for two that the spectrum does not resolve.
+    constexpr double resolved = 4; // bins
+    constexpr int32_t mostSplit = 2;
+    for (int32_t i = 0; i < std::min(around.count, mostSplit); ++i) {
+        const double other = around.lines[i].frequency;
+        if (std::fabs(other - frequency) * n_ < resolved)
+            for (const double bins : {0.3, -0.3, 0.8, -0.8})
+                fitFrom(around, other, i, bins / n_, least);
+    }
+    fit_.begin(samples_.data(), n_);
+    return least;
 }
 
 // By its height above the median of the spectrum; and, where the record is too short for that or
@@ -175,7 +251,7 @@ ErrorCode ToneSearch::add(const Band &band, bool evenInNoise, Step &step) {
     step = Step::Exhausted;
     if (count_ > 0 && 3 * (int64_t{count_} + 1) + 1 > n_)
         return 0;
-    if (const ErrorCode failed = reserve(count_ + 1, count_ + 1))
+    if (const ErrorCode failed = reserve(count_ + 1))
         return failed;
     Peak peak;
     if (const ErrorCode failed = largestLine(band, peak))
@@ -185,50 +261,43 @@ ErrorCode ToneSearch::add(const Band &band, bool evenInNoise, Step &step) {
         largest = std::max(largest, Amplitude(lines()[l]));
     if (!(peak.amplitude > smallestPart * largest))
         return 0;
-    std::copy(lines(), lines() + count_, former());
-    State least = {constant_, squares_};
-    const State before = least;
-    fitFrom(peak.frequency, -1, 0, least);
-    // A line near it may stand for two that the spectrum does not resolve.
-    constexpr double resolved = 4; // bins
-    for (int32_t l = 0; l < count_; ++l) {
-        const double frequency = former()[l].frequency;
-        if (std::fabs(frequency - peak.frequency) * n_ < resolved)
-            for (const double bins : {0.3, -0.3, 0.8, -0.8})
-                fitFrom(frequency, l, bins / n_, least);
-    }
-
-    if (!(least.squares < before.squares)) {
-        std::copy(former(), former() + count_, lines());
+    const Neighbourhood around = linesAround(peak.frequency);
+    const Neighbourhood least = fitNearby(around, peak.frequency);
+    if (least.count == around.count)
         return 0;
-    }
-    const bool isFirst = count_ == 0;
-    std::copy(best(), best() + count_ + 1, lines());
-    ++count_;
-    constant_ = least.constant;
+
+    const double constantBefore = constant_, squaresBefore = squares_;
+    std::copy(lines(), lines() + count_, former());
+    for (int32_t i = 0; i < around.count; ++i)
+        lines()[around.places[i]] = least.lines[i];
+    lines()[count_] = least.lines[around.count];
+    constant_ += least.constant;
     squares_ = least.squares;
+    ++count_;
+    if (least.count < count_)
+        squares_ = fit_.refine(lines(), count_, Frequencies::Own, searching, constant_);
     step = Step::Added;
-    if (!isFirst && !evenInNoise && !isAboveNoise(peak, before.squares)) {
+    if (count_ > 1 && !evenInNoise && !isAboveNoise(peak, squaresBefore)) {
         --count_;
         std::copy(former(), former() + count_, lines());
-        constant_ = before.constant;
-        squares_ = before.squares;
+        constant_ = constantBefore;
+        squares_ = squaresBefore;
         step = Step::OnlyNoise;
     }
     return 0;
 }
 
 void ToneSearch::settle() {
-    squares_ = fit_.refine(lines(), count_, count_, settledForGood, constant_);
+    squares_ = fit_.refine(lines(), count_, Frequencies::Own, forGood, constant_);
 }
 
-ErrorCode ToneSearch::replace(const Line *from, int32_t count, int32_t groups) {
+ErrorCode ToneSearch::replace(const Line *from, int32_t count) {
     count_ = 0;
-    if (const ErrorCode failed = reserve(count, groups))
+    if (const ErrorCode failed = reserve(count))
         return failed;
     std::copy(from, from + count, lines());
     count_ = count;
-    squares_ = fit_.refine(lines(), count, groups, settledForGood, constant_);
+    squares_ = fit_.refine(lines(), count, Frequencies::Common, forGood, constant_);
     return 0;
 }
 

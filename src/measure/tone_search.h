@@ -41,8 +41,8 @@ public:
 
     // Fits the tones to the last digits, when all are found.
     void settle();
-    // Lines that share their frequencies, from here on in the place of the tones; fitted.
-    ErrorCode replace(const Line *lines, int32_t count, int32_t groups);
+    // Lines with a common frequency, from here on in the place of the tones; fitted.
+    ErrorCode replace(const Line *lines, int32_t count);
     // The root mean square of what constant and tones leave; residual, if not null, gets all of it.
     double residualRms(DBL *residual);
     // The same without the tones but the first `count`, or but this one.
@@ -58,21 +58,32 @@ private:
         double frequency, amplitude;
         double overNoise; // of its power
     };
-    struct State {
+    // The lines that are fitted together with a new one, which is the last; the others stay.
+    static constexpr int32_t mostNearby = 8;
+    struct Neighbourhood {
+        I32 places[mostNearby]; // in the list of tones, from the nearest on
+        Line lines[mostNearby + 1];
+        int32_t count;
         double constant, squares;
     };
 
     Line *lines() const { return static_cast<Line *>(lineMemory_.bytes()); }
     Line *former() const { return lines() + capacity_; }
-    Line *best() const { return former() + capacity_; }
-    ErrorCode reserve(int32_t count, int32_t groups);
+    ErrorCode reserve(int32_t count);
+    ErrorCode reserveSpectrum();
     ErrorCode largestLine(const Band &band, Peak &peak);
-    void fitFrom(double frequency, int32_t split, double offset, State &least);
+    double noiseOf(const DBL *power, int32_t count);
+    Neighbourhood linesAround(double frequency) const;
+    void fitFrom(const Neighbourhood &around, double frequency, int32_t split, double offset,
+                 Neighbourhood &least);
+    Neighbourhood fitNearby(const Neighbourhood &around, double frequency);
     bool isAboveNoise(const Peak &peak, double squaresBefore) const;
 
     int32_t n_ = 0;
     double unit_ = 1, level_ = 0;
-    Scratch<ElementType::DBL> samples_;
+    Scratch<ElementType::DBL> samples_, residual_, window_;
+    int32_t spectrumLength_ = 0;
+    Scratch<ElementType::DBL> work_, spectrum_;
     SinusoidFit fit_;
     std::optional<PlanReference> plan_;
     ScratchBytes lineMemory_;

@@ -28,6 +28,9 @@ QX_BY_WIDTH(void, SumByWave, (const DBL *waves, const DBL *left, double *sums))
 // The sums of left and of its squares, likewise.
 QX_BY_WIDTH(void, SumOfBlock, (const DBL *left, double *sums))
 
+// The sum of a[i] b[i], likewise; n may be 0, and is no multiple of anything.
+QX_BY_WIDTH(double, SumOfProducts, (const DBL *a, const DBL *b, int32_t n))
+
 } // namespace qx
 
 #endif

@@ -79,4 +79,18 @@ void SumOfBlock(const DBL *left, double *sums) {
     sums[1] = squares.total();
 }
 
+double SumOfProducts(const DBL *a, const DBL *b, int32_t n) {
+    Fourfold products;
+    int32_t i = 0;
+    for (; n - i >= sumsOfEach; i += sumsOfEach)
+        for (int32_t p = 0; p < parts; ++p) {
+            const int32_t at = i + p * nativeLanes;
+            products.sums[p] = products.sums[p] + L::load(a + at) * L::load(b + at);
+        }
+    double sum = products.total();
+    for (; i < n; ++i)
+        sum += a[i] * b[i];
+    return sum;
+}
+
 } // namespace qx::QX_WIDTH

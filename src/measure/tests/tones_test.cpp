@@ -8,6 +8,7 @@
 
 #include <algorithm>
 #include <cmath>
+#include <ctime>
 #include <limits>
 #include <numbers>
 #include <vector>
@@ -208,6 +209,21 @@ TEST(MultipleTones, ComeInTheOrderAskedForAndAreTheLeastSquares) {
                 changed[k].*part += change;
                 EXPECT_GT(leaves(changed), rising.residualRms);
             }
+}
+
+// Fits to a record that is no sum of tones do not settle, and each further tone moves the others.
+// Without bounds of their steps and of what is fitted together this takes minutes.
+TEST(MultipleTones, OfAnImpulseTakeTheTimeOfSamplesAndTones) {
+    constexpr int32_t n = 1000;
+    Samples y(n);
+    for (int32_t t = 0; t < n; ++t)
+        y[static_cast<std::size_t>(t)] = t * 37 % 64 / 64.0 - 0.5;
+    y[0] = 1002;
+    const std::clock_t begin = std::clock();
+    const Multiple found = Measure(y, 100);
+    EXPECT_LT(std::clock() - begin, 60 * CLOCKS_PER_SEC);
+    EXPECT_EQ(found.tones.size(), 100u);
+    EXPECT_LT(found.residualRms, Measure(y, 50).residualRms);
 }
 
 TEST(SingleTone, IsTheLargestOfItsBand) {
