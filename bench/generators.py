@@ -78,10 +78,19 @@ def coordinate_cases(n):
         return (np.hypot(from_axis, points[2]), np.arctan2(points[1], points[0]),
                 np.arctan2(from_axis, points[2]))
 
+    def cartesian(radius, azimuth, inclination):
+        from_axis = radius * np.sin(inclination)
+        return from_axis * np.cos(azimuth), from_axis * np.sin(azimuth), radius * np.cos(inclination)
+
+    angles = spherical()
     return [
         ("rotate", lambda: qx.call("CoordRotationDirection_head", *points, direction),
          lambda: direction @ points),
         ("to spherical", lambda: qx.call("CoordConversion_head", 0, 1, *points), spherical),
+        ("to cylindrical", lambda: qx.call("CoordConversion_head", 0, 2, *points),
+         lambda: (np.hypot(points[0], points[1]), np.arctan2(points[1], points[0]), points[2].copy())),
+        ("from spherical", lambda: qx.call("CoordConversion_head", 1, 0, *angles),
+         lambda: cartesian(*angles)),
     ]
 
 

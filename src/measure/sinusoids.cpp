@@ -31,8 +31,8 @@ Kernel SumDirectly(double turns, int32_t n) {
     return sum;
 }
 
-// Nearer to 0 the derivatives of the quotient lose their digits, and so near to each other are hardly
-// ever two lines.
+// Nearer to 0 the derivatives of the quotient lose their digits, and so near to each other are
+// hardly ever two lines.
 constexpr double nearZero = 0.05;
 
 // Of N(x) / sin x with x = theta / 2 and N(x) = sin(n x): first and second derivative by x.
@@ -177,9 +177,8 @@ double SinusoidFit::sumOfSquares(const Line *lines, int32_t count, double consta
         for (int32_t l = 0; l < count; ++l) {
             atBlock_[l] = first % turned == 0 ? PhasorOf(lines[l].frequency, s0)
                                               : Sum(atBlock_[l], ofBlock_[l]);
-            SubtractWave(
-                {atBlock_[l].cosine, atBlock_[l].sine, lines[l].cosine, lines[l].sine},
-                table_ + wave * l, waves_ + wave * l, left);
+            SubtractWave({atBlock_[l].cosine, atBlock_[l].sine, lines[l].cosine, lines[l].sine},
+                         table_ + wave * l, waves_ + wave * l, left);
         }
         Fill(left + length, waveBlock - length, 0.0);
         double ofBlock[2];
@@ -253,12 +252,11 @@ void SinusoidFit::kernelsOf(const Line *lines, int32_t p, int32_t q, Kernel &les
     const Phasor *const ofQ = halfAngles_ + 2 * std::ptrdiff_t{q};
     const double difference = lines[p].frequency - lines[q].frequency;
     const double sum = lines[p].frequency + lines[q].frequency;
-    less = difference * n_ < nearZero ? KernelAt(difference, n_)
-                                      : FromHalfAngle(Difference(ofP[0], ofQ[0]),
-                                                      Difference(ofP[1], ofQ[1]), n_);
-    more = (1 - sum) * n_ < nearZero
-               ? KernelAt(sum, n_)
-               : FromHalfAngle(Sum(ofP[0], ofQ[0]), Sum(ofP[1], ofQ[1]), n_);
+    less = difference * n_ < nearZero
+               ? KernelAt(difference, n_)
+               : FromHalfAngle(Difference(ofP[0], ofQ[0]), Difference(ofP[1], ofQ[1]), n_);
+    more = (1 - sum) * n_ < nearZero ? KernelAt(sum, n_)
+                                     : FromHalfAngle(Sum(ofP[0], ofQ[0]), Sum(ofP[1], ofQ[1]), n_);
 }
 
 // Of the derivatives by the parameters of two lines, in the order of their frequencies.

@@ -22,8 +22,8 @@ struct Line {
 struct Phasor {
     DBL cosine, sine;
 };
-// Sums over the record of cos(theta s), s sin(theta s) and s^2 cos(theta s): the Dirichlet kernel and
-// its derivatives.
+// Sums over the record of cos(theta s), s sin(theta s) and s^2 cos(theta s): the Dirichlet kernel
+// and its derivatives.
 struct Kernel {
     double cosines, sines, squares;
 };
@@ -39,9 +39,9 @@ double PhaseAtStart(const Line &line, int32_t n);
 double PartOfTurn(double value, double count);
 
 // How far a fit goes. It ends before a step that would take less than the part `settled` of the sum
-// of squares, or after mostSteps. The matrix of a step leaves out what lines more than `reach` places
-// apart in the order of their frequencies have in common, which makes the steps less good, not the
-// fit.
+// of squares, or after mostSteps. The matrix of a step leaves out what lines more than `reach`
+// places apart in the order of their frequencies have in common, which makes the steps less good,
+// not the fit.
 struct FitEffort {
     double settled;
     int32_t mostSteps;
@@ -62,12 +62,13 @@ public:
     // Memory for so many lines, of which the rest of the calls may have fewer. ErrOutOfMemory.
     ErrorCode reserve(int32_t lines);
 
-    // Moves the lines and the constant from where they are to the least squares nearby. What is left
-    // of the sum of squares.
+    // Moves the lines and the constant from where they are to the least squares nearby. What is
+    // left of the sum of squares.
     double refine(Line *lines, int32_t count, Frequencies frequencies, const FitEffort &effort,
                   double &constant);
 
-    // What is left of the samples, and the sum of its squares; residual may be null, or the samples.
+    // What is left of the samples, and the sum of its squares; residual may be null, or the
+    // samples.
     double residualOf(const Line *lines, int32_t count, double constant, DBL *residual);
 
 private:
@@ -96,8 +97,8 @@ private:
         DBL *row(DBL *matrix, std::ptrdiff_t row) const {
             return matrix + row * width() - firstInRow(row);
         }
-        // Of the products of lines so many places apart: 1, or weights that fall to 0 beyond the reach
-        // and so leave the matrix positive (I. Schur, 1911).
+        // Of the products of lines so many places apart: 1, or weights that fall to 0 beyond the
+        // reach and so leave the matrix positive (I. Schur, 1911).
         double weight(std::ptrdiff_t apart) const {
             return count <= reach ? 1.0 : 1.0 - static_cast<double>(apart) / (reach + 1.0);
         }

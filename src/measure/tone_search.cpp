@@ -16,8 +16,8 @@ namespace {
 // Lines below this part of the largest tone are rounding.
 constexpr double smallestPart = 1e-12;
 
-// How far fits go: while tones are still sought, what is off must not be seen as a line; in the end it
-// must be far below what noise does. The bounds of the steps are for records that are no tones.
+// How far fits go: while tones are still sought, what is off must not be seen as a line; in the end
+// it must be far below what noise does. The bounds of the steps are for records that are no tones.
 constexpr FitEffort nearby = {1e-6, 20, SinusoidFit::farthestReach};
 constexpr FitEffort searching = {1e-6, 3, 12};
 constexpr FitEffort forGood = {1e-20, 100, SinusoidFit::farthestReach};
@@ -203,8 +203,7 @@ void ToneSearch::fitFrom(const Neighbourhood &around, double frequency, int32_t 
         trial.lines[split].frequency = frequency - offset;
     }
     ++trial.count;
-    trial.squares =
-        fit_.refine(trial.lines, trial.count, Frequencies::Own, nearby, trial.constant);
+    trial.squares = fit_.refine(trial.lines, trial.count, Frequencies::Own, nearby, trial.constant);
     if (trial.squares < least.squares)
         least = trial;
 }

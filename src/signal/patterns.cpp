@@ -3,6 +3,7 @@
 #include "frame/constants.h"
 #include "frame/elements.h"
 #include "frame/outcome.h"
+#include "mathlib/elementary.h"
 #include "signal/waves.h"
 
 #include <cmath>
@@ -186,8 +187,9 @@ double ModulatePhase(int32_t n, double dt, double fc, DBL *y, double &peak, doub
     for (int32_t i = 0; i < n; ++i) {
         FollowPeak(y[i], peak);
         phase = Wrapped(phase + step, limit);
-        y[i] = std::sin(y[i] * kPi / 180.0 + phase * dt);
+        y[i] = y[i] * kPi / 180.0 + phase * dt;
     }
+    Sines(y, n, y);
     // kept: the last output, a sine, is added to degrees.
     return Degrees(phase, dt) + (n > 0 ? static_cast<double>(y[n - 1]) : 0.0);
 }
@@ -198,8 +200,9 @@ double ModulateFrequency(int32_t n, double dt, double fc, DBL *y, double &peak, 
     for (int32_t i = 0; i < n; ++i) {
         FollowPeak(y[i], peak);
         phase = Wrapped(y[i] * 2.0 * kPi + step + phase, limit);
-        y[i] = std::sin(phase * dt);
+        y[i] = phase * dt;
     }
+    Sines(y, n, y);
     return Degrees(phase, dt);
 }
 

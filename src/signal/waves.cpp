@@ -2,6 +2,7 @@
 
 #include "frame/constants.h"
 #include "frame/elements.h"
+#include "mathlib/elementary.h"
 
 #include <algorithm>
 #include <cmath>
@@ -137,7 +138,10 @@ ErrorCode GenArbitraryWave(int32_t n, double amp, double f, double &phase, const
 void GenChirp(int32_t n, double amp, double f1, double f2, DBL *y) {
     const double step = (f2 - f1) * kPi / n;
     for (int32_t i = 0; i < n; ++i)
-        y[i] = amp * std::sin(i * (step * i + 2.0 * kPi * f1));
+        y[i] = i * (step * i + 2.0 * kPi * f1);
+    Sines(y, n, y);
+    for (int32_t i = 0; i < n; ++i)
+        y[i] = amp * y[i];
 }
 
 } // namespace qx

@@ -2,8 +2,10 @@
 
 #include "frame/constants.h"
 #include "frame/extended.h"
+#include "mathlib/elementary.h"
 #include "util/scaling.h"
 
+#include <algorithm>
 #include <cmath>
 
 namespace qx {
@@ -185,91 +187,155 @@ void Rotate3D(const DBL *const from[3], int32_t n, const Rotation &rotation, DBL
 
 namespace {
 
+// Points are converted a block at a time, so that what lies between stays in the cache.
+constexpr int32_t block = 128;
+typedef DBL Column[block];
+
 // A zero without its sign, so that the azimuth of (-1, -0) is pi and that of (-0, 0) is 0.
 double Unsigned(double x) { return x + 0.0; }
 
+void WithoutSignsOfZeros(const DBL *x, int32_t n, DBL *y) {
+    for (int32_t i = 0; i < n; ++i)
+        y[i] = Unsigned(x[i]);
+}
+
 // atan2 may round to -pi.
-double Azimuth(double y, double x) {
-    const double azimuth = std::atan2(Unsigned(y), Unsigned(x));
-    return azimuth == -kPi ? kPi : azimuth;
+void Azimuths(const DBL *y, const DBL *x, int32_t n, DBL *azimuths) {
+    Column height, width;
+    WithoutSignsOfZeros(y, n, height);
+    WithoutSignsOfZeros(x, n, width);
+    ArcTangents(height, width, n, azimuths);
+    for (int32_t i = 0; i < n; ++i)
+        if (azimuths[i] == -kPi)
+            azimuths[i] = kPi;
 }
 
-// What the azimuth becomes where the distance from the axis is negative or the azimuth itself is
-// beyond its range.
-double AzimuthInRange(double azimuth, double fromAxis) {
-    if (fromAxis >= 0.0 && azimuth > -kPi && azimuth <= kPi)
-        return azimuth;
-    const double side = fromAxis < 0.0 ? -1.0 : 1.0;
-    return Azimuth(side * std::sin(azimuth), side * std::cos(azimuth));
+void Inclinations(const DBL *fromAxis, const DBL *height, int32_t n, DBL *inclinations) {
+    Column above;
+    WithoutSignsOfZeros(height, n, above);
+    ArcTangents(fromAxis, above, n, inclinations);
 }
 
-double Inclination(double fromAxis, double height) {
-    return std::atan2(fromAxis, Unsigned(height));
+// What azimuths become where the distance from the axis is negative or the azimuth itself is
+// beyond its range; 0 on the axis.
+void AzimuthsInRange(const DBL *given, const DBL *fromAxis, int32_t n, DBL *azimuths) {
+    bool areInRange = true;
+    for (int32_t i = 0; i < n; ++i) {
+        azimuths[i] = fromAxis[i] == 0.0 ? 0.0 : given[i];
+        areInRange &= fromAxis[i] >= 0.0 && azimuths[i] > -kPi && azimuths[i] <= kPi;
+    }
+    if (areInRange)
+        return;
+    Column sines, cosines;
+    SinesAndCosines(given, n, sines, cosines);
+    for (int32_t i = 0; i < n; ++i) {
+        const double side = fromAxis[i] < 0.0 ? -1.0 : 1.0;
+        sines[i] *= side;
+        cosines[i] *= side;
+    }
+    Azimuths(sines, cosines, n, cosines);
+    for (int32_t i = 0; i < n; ++i)
+        if (!(fromAxis[i] >= 0.0 && azimuths[i] > -kPi && azimuths[i] <= kPi))
+            azimuths[i] = cosines[i];
 }
 
-struct Point {
-    double first, second, third;
-};
+void Magnitudes(const DBL *x, int32_t n, DBL *magnitudes) {
+    for (int32_t i = 0; i < n; ++i)
+        magnitudes[i] = std::fabs(x[i]);
+}
 
-Point CartesianToCylindrical(Point p) {
-    return {std::hypot(p.first, p.second), Azimuth(p.second, p.first), p.third};
+void Products(const DBL *x, const DBL *y, int32_t n, DBL *products) {
+    for (int32_t i = 0; i < n; ++i)
+        products[i] = x[i] * y[i];
 }
-Point CylindricalToCartesian(Point p) {
-    return {p.first * std::cos(p.second), p.first * std::sin(p.second), p.third};
+
+// Of a block of n points; the results lie apart from them.
+typedef const DBL *const *From;
+typedef DBL *const *To;
+
+void CartesianToCylindrical(From p, int32_t n, To q) {
+    Hypotenuses(p[0], p[1], n, q[0]);
+    Azimuths(p[1], p[0], n, q[1]);
+    std::copy(p[2], p[2] + n, q[2]);
 }
-Point CylindricalToSpherical(Point p) {
-    const double fromAxis = std::fabs(p.first);
-    return {std::hypot(fromAxis, p.third),
-            fromAxis == 0.0 ? 0.0 : AzimuthInRange(p.second, p.first),
-            Inclination(fromAxis, p.third)};
+void CylindricalToCartesian(From p, int32_t n, To q) {
+    Column sines, cosines;
+    SinesAndCosines(p[1], n, sines, cosines);
+    Products(p[0], cosines, n, q[0]);
+    Products(p[0], sines, n, q[1]);
+    std::copy(p[2], p[2] + n, q[2]);
 }
-Point SphericalToCylindrical(Point p) {
-    const double fromAxis = p.first * std::sin(p.third);
-    return {std::fabs(fromAxis), fromAxis == 0.0 ? 0.0 : AzimuthInRange(p.second, fromAxis),
-            p.first * std::cos(p.third)};
+void CylindricalToSpherical(From p, int32_t n, To q) {
+    Column fromAxis;
+    Magnitudes(p[0], n, fromAxis);
+    Hypotenuses(fromAxis, p[2], n, q[0]);
+    AzimuthsInRange(p[1], p[0], n, q[1]);
+    Inclinations(fromAxis, p[2], n, q[2]);
+}
+void SphericalToCylindrical(From p, int32_t n, To q) {
+    Column sines, cosines;
+    SinesAndCosines(p[2], n, sines, cosines);
+    Products(p[0], sines, n, sines);
+    Magnitudes(sines, n, q[0]);
+    AzimuthsInRange(p[1], sines, n, q[1]);
+    Products(p[0], cosines, n, q[2]);
 }
 // The distance from the axis may overflow where no result does.
-Point CartesianToSpherical(Point p) {
+void CartesianToSpherical(From p, int32_t n, To q) {
     constexpr double down = 0x1p-2;
     constexpr double up = 0x1p+2;
-    const double fromAxis = std::hypot(down * p.first, down * p.second);
-    if (std::isnormal(fromAxis))
-        return {up * std::hypot(fromAxis, down * p.third), Azimuth(p.second, p.first),
-                Inclination(fromAxis, down * p.third)};
-    return {std::hypot(std::hypot(p.first, p.second), p.third), Azimuth(p.second, p.first),
-            Inclination(std::hypot(p.first, p.second), p.third)};
-}
-Point SphericalToCartesian(Point p) {
-    const double fromAxis = p.first * std::sin(p.third);
-    return {fromAxis * std::cos(p.second), fromAxis * std::sin(p.second),
-            p.first * std::cos(p.third)};
-}
-Point Copied(Point p) { return p; }
-
-template <Point (*Convert)(Point)>
-void ConvertEach(const DBL *const points[3], int32_t n, DBL *const converted[3]) {
+    Column x, y, z, fromAxis, scale;
     for (int32_t i = 0; i < n; ++i) {
-        const Point p = Convert({points[0][i], points[1][i], points[2][i]});
-        converted[0][i] = p.first;
-        converted[1][i] = p.second;
-        converted[2][i] = p.third;
+        x[i] = down * p[0][i];
+        y[i] = down * p[1][i];
+        z[i] = down * p[2][i];
     }
+    Hypotenuses(x, y, n, fromAxis);
+    for (int32_t i = 0; i < n; ++i) {
+        scale[i] = up;
+        if (std::isnormal(fromAxis[i]))
+            continue;
+        scale[i] = 1.0;
+        fromAxis[i] = std::hypot(p[0][i], p[1][i]);
+        z[i] = p[2][i];
+    }
+    Hypotenuses(fromAxis, z, n, q[0]);
+    Products(q[0], scale, n, q[0]);
+    Azimuths(p[1], p[0], n, q[1]);
+    Inclinations(fromAxis, z, n, q[2]);
+}
+void SphericalToCartesian(From p, int32_t n, To q) {
+    Column sines, cosines, fromAxis;
+    SinesAndCosines(p[2], n, sines, cosines);
+    Products(p[0], sines, n, fromAxis);
+    Products(p[0], cosines, n, q[2]);
+    SinesAndCosines(p[1], n, sines, cosines);
+    Products(fromAxis, cosines, n, q[0]);
+    Products(fromAxis, sines, n, q[1]);
+}
+void Copied(From p, int32_t n, To q) {
+    for (int k = 0; k < 3; ++k)
+        std::copy(p[k], p[k] + n, q[k]);
 }
 
 } // namespace
 
 void ConvertCoordinates(Coordinates from, Coordinates to, const DBL *const points[3], int32_t n,
                         DBL *const converted[3]) {
-    typedef void (*Conversion)(const DBL *const *, int32_t, DBL *const *);
+    typedef void (*Conversion)(From, int32_t, To);
     static constexpr Conversion conversions[coordinateKinds][coordinateKinds] = {
-        {ConvertEach<Copied>, ConvertEach<CartesianToSpherical>,
-         ConvertEach<CartesianToCylindrical>},
-        {ConvertEach<SphericalToCartesian>, ConvertEach<Copied>,
-         ConvertEach<SphericalToCylindrical>},
-        {ConvertEach<CylindricalToCartesian>, ConvertEach<CylindricalToSpherical>,
-         ConvertEach<Copied>},
+        {Copied, CartesianToSpherical, CartesianToCylindrical},
+        {SphericalToCartesian, Copied, SphericalToCylindrical},
+        {CylindricalToCartesian, CylindricalToSpherical, Copied},
     };
-    conversions[static_cast<int32_t>(from)][static_cast<int32_t>(to)](points, n, converted);
+    const Conversion convert = conversions[static_cast<int32_t>(from)][static_cast<int32_t>(to)];
+    for (int32_t begin = 0; begin < n;) {
+        const int32_t length = std::min(block, n - begin);
+        const DBL *const p[] = {points[0] + begin, points[1] + begin, points[2] + begin};
+        DBL *const q[] = {converted[0] + begin, converted[1] + begin, converted[2] + begin};
+        convert(p, length, q);
+        begin += length;
+    }
 }
 
 } // namespace qx
