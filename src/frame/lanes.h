@@ -5,8 +5,6 @@
 #include "qx/types.h"
 
 #include <cstddef>
-#include <cstdint>
-#include <immintrin.h>
 
 // Operations become part of the loop that uses them, at every level of optimisation.
 #define QX_INLINE __attribute__((always_inline)) inline
@@ -41,42 +39,13 @@ template <>
 struct LaneVector<2> {
     typedef double type __attribute__((vector_size(16)));
     typedef double inMemory __attribute__((vector_size(16), aligned(1), may_alias));
-    typedef int64_t bits __attribute__((vector_size(16)));
     static QX_INLINE type broadcast(double x) { return type{x, x}; }
 };
 template <>
 struct LaneVector<4> {
     typedef double type __attribute__((vector_size(32)));
     typedef double inMemory __attribute__((vector_size(32), aligned(1), may_alias));
-    typedef int64_t bits __attribute__((vector_size(32)));
     static QX_INLINE type broadcast(double x) { return type{x, x, x, x}; }
-};
-
-// A truth for each lane, as comparisons give it. (Not for N = 1.)
-template <int N>
-class LaneMask {
-public:
-    typedef typename LaneVector<N>::bits Bits;
-
-    QX_INLINE LaneMask() = default;
-    QX_INLINE explicit LaneMask(Bits mask) : m(mask) {}
-
-    friend QX_INLINE LaneMask operator&(LaneMask a, LaneMask b) { return LaneMask(a.m & b.m); }
-    friend QX_INLINE LaneMask operator|(LaneMask a, LaneMask b) { return LaneMask(a.m | b.m); }
-    friend QX_INLINE LaneMask operator!(LaneMask a) { return LaneMask(~a.m); }
-    friend QX_INLINE bool Any(LaneMask a) {
-        if constexpr (N == 2)
-            return _mm_movemask_pd(reinterpret_cast<__m128d>(a.m)) != 0;
-#ifdef __AVX2__
-        else
-            return _mm256_movemask_pd(reinterpret_cast<__m256d>(a.m)) != 0;
-#else
-        else
-            return (a.m[0] | a.m[1] | a.m[2] | a.m[3]) != 0;
-#endif
-    }
-
-    Bits m;
 };
 
 template <int N>
@@ -154,31 +123,6 @@ public:
     friend QX_INLINE Lanes operator*(Lanes a, Lanes b) { return Lanes(a.v * b.v); }
     friend QX_INLINE Lanes operator/(Lanes a, Lanes b) { return Lanes(a.v / b.v); }
     friend QX_INLINE Lanes operator-(Lanes a) { return Lanes(-a.v); }
-
-    // What follows is not for N = 1. Comparisons with NaN are false.
-    typedef typename LaneVector<N>::bits Bits;
-    typedef LaneMask<N> Mask;
-    friend QX_INLINE Mask operator<(Lanes a, Lanes b) { return Mask((Bits)(a.v < b.v)); }
-    friend QX_INLINE Mask operator<=(Lanes a, Lanes b) { return Mask((Bits)(a.v <= b.v)); }
-    friend QX_INLINE Mask operator==(Lanes a, Lanes b) { return Mask((Bits)(a.v == b.v)); }
-    friend QX_INLINE Lanes Select(Mask where, Lanes a, Lanes b) {
-        return Lanes(where.m ? a.v : b.v);
-    }
-    friend QX_INLINE Lanes Sqrt(Lanes a) {
-        Lanes root;
-        for (int i = 0; i < N; ++i)
-            root.v[i] = __builtin_sqrt(a.v[i]);
-        return root;
-    }
-
-    // The bits of the numbers, and numbers of such bits.
-    QX_INLINE Bits bits() const { return (Bits)v; }
-    static QX_INLINE Lanes ofBits(Bits bits) { return Lanes((Vector)bits); }
-    friend QX_INLINE Lanes Magnitude(Lanes a) { return ofBits(a.bits() & ~signBit); }
-    friend QX_INLINE Lanes CopySign(Lanes magnitude, Lanes sign) {
-        return ofBits((magnitude.bits() & ~signBit) | (sign.bits() & signBit));
-    }
-    static constexpr int64_t signBit = INT64_MIN;
 
     Vector v;
 };

@@ -21,15 +21,13 @@ QX_INLINE void ForEach(int32_t n, OfLanes lanes, OfOne one) {
         one(i);
 }
 
-const L::Mask none = L(0.0) < L(0.0);
-
 } // namespace
 
 void Sines(const DBL *x, int32_t n, DBL *sines) {
     ForEach(
         n,
         [&](int32_t i) {
-            L::Mask rare = none;
+            LaneMask<L> rare = {};
             const L sine = SineCosine(L::load(x + i), rare).sine;
             if (Any(rare))
                 return false;
@@ -43,7 +41,7 @@ void SinesAndCosines(const DBL *x, int32_t n, DBL *sines, DBL *cosines) {
     ForEach(
         n,
         [&](int32_t i) {
-            L::Mask rare = none;
+            LaneMask<L> rare = {};
             const SineAndCosine<L> both = SineCosine(L::load(x + i), rare);
             if (Any(rare))
                 return false;
@@ -62,7 +60,7 @@ void ArcTangents(const DBL *y, const DBL *x, int32_t n, DBL *angles) {
     ForEach(
         n,
         [&](int32_t i) {
-            L::Mask rare = none;
+            LaneMask<L> rare = {};
             const L angle = ArcTangent(L::load(y + i), L::load(x + i), rare);
             if (Any(rare))
                 return false;
@@ -76,7 +74,7 @@ void Hypotenuses(const DBL *x, const DBL *y, int32_t n, DBL *lengths) {
     ForEach(
         n,
         [&](int32_t i) {
-            L::Mask rare = none;
+            LaneMask<L> rare = {};
             const L length = Hypotenuse(L::load(x + i), L::load(y + i), rare);
             if (Any(rare))
                 return false;

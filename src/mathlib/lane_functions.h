@@ -1,7 +1,7 @@
 #ifndef QX_MATHLIB_LANE_FUNCTIONS_H
 #define QX_MATHLIB_LANE_FUNCTIONS_H
 
-#include "frame/lanes.h"
+#include "frame/lane_masks.h"
 
 // Elementary functions over lanes, with the bits of the module's sin, cos, atan2 and hypot: the
 // same operations in the same order, with masks in the place of branches. Arguments for which the
@@ -9,7 +9,7 @@
 // infinities, NaN, numbers near the ends of the range) are marked in `rare`, and the results of
 // these lanes mean nothing: the scalar function has to be called for them.
 //
-//     typename L::Mask rare = L(0.0) < L(0.0);
+//     LaneMask<L> rare = {};
 //     const SineAndCosine<L> both = SineCosine(L::load(x), rare);
 //     if (!Any(rare)) ...
 //
@@ -17,11 +17,6 @@
 // (Sun Microsystems, 1993); the other two functions are described where the scalar ones are.
 
 namespace qx {
-#ifdef __AVX2__
-inline namespace lanes4 {
-#else
-inline namespace lanes2 {
-#endif
 
 template <class L>
 struct LanePair {
@@ -58,14 +53,14 @@ QX_INLINE LanePair<L> PairQuotient(LanePair<L> a, LanePair<L> b) {
     return QuickSum(quotient, rest / b.hi);
 }
 template <class L>
-QX_INLINE LanePair<L> Select(typename L::Mask where, LanePair<L> a, LanePair<L> b) {
+QX_INLINE LanePair<L> Select(LaneMask<L> where, LanePair<L> a, LanePair<L> b) {
     return {Select(where, a.hi, b.hi), Select(where, a.lo, b.lo)};
 }
 
 // 2^k of a normal number from 2^k to 2^(k + 1); 0 of one below.
 template <class L>
 QX_INLINE L PowerOfTwo(L x) {
-    return L::ofBits(x.bits() & 0x7ff0000000000000);
+    return OfBits<L>(ToBits(x) & 0x7ff0000000000000);
 }
 
 // An angle less a multiple of pi/2, as y + tail in -pi/4 to pi/4. The two lowest bits of `quadrant`
@@ -73,11 +68,11 @@ QX_INLINE L PowerOfTwo(L x) {
 template <class L>
 struct ReducedAngle {
     L y, tail, quadrant;
-    typename L::Mask isSmall; // |x| below pi/4: not reduced
+    LaneMask<L> isSmall; // |x| below pi/4: not reduced
 };
 
 template <class L>
-QX_INLINE ReducedAngle<L> Reduced(L x, typename L::Mask &rare) {
+QX_INLINE ReducedAngle<L> Reduced(L x, LaneMask<L> &rare) {
     const L toInteger(0x1.8p52);
     const L high(0x1.921fb544p+0), highTail(0x1.0b4611a626331p-34);
     const L middle(0x1.0b4611a6p-34), middleTail(0x1.3198a2e037073p-69);
@@ -88,7 +83,7 @@ QX_INLINE ReducedAngle<L> Reduced(L x, typename L::Mask &rare) {
     const L tail = multiple * highTail;
     const L once = left - tail;
     // Where more than 16 bits cancel, as much again is taken away.
-    const typename L::Mask cancels = PowerOfTwo(once) <= PowerOfTwo(size) * L(0x1p-17);
+    const LaneMask<L> cancels = PowerOfTwo(once) <= PowerOfTwo(size) * L(0x1p-17);
     const L again = multiple * middle;
     const L leftAgain = left - again;
     const L tailAgain = multiple * middleTail - ((left - leftAgain) - again);
@@ -97,8 +92,8 @@ QX_INLINE ReducedAngle<L> Reduced(L x, typename L::Mask &rare) {
     // Beyond 2^20 pi/2 the reduction is another one, and next to odd multiples of pi/4 the
     // multiple is. Up to 9/4 pi the second round depends on how near a multiple of pi/2 is, and a
     // third round comes where 49 bits cancel.
-    const typename L::Mask isMedium = size < L(0x1.921fbp+20);
-    const typename L::Mask isSmall = size < L(0x1.921fcp-1);
+    const LaneMask<L> isMedium = size < L(0x1.921fbp+20);
+    const LaneMask<L> isSmall = size < L(0x1.921fcp-1);
     const L y = Select(cancels, twice, once);
     rare = rare | !isMedium | (L(0x1.921fp-1) < Magnitude(once)) |
            (cancels & !isSmall &
@@ -140,13 +135,13 @@ QX_INLINE L CosinePolynomial(const ReducedAngle<L> &x) {
 // In an odd quadrant sine and cosine change places. In two of four the sign changes: of sines where
 // bit 1 of the quadrant's number is set, of cosines where one of the bits 0 and 1 is.
 template <class L>
-QX_INLINE typename L::Mask IsOdd(L quadrant) {
+QX_INLINE LaneMask<L> IsOdd(L quadrant) {
     const L one(1.0);
-    return !(L::ofBits((quadrant.bits() & 1) | one.bits()) == one);
+    return !(OfBits<L>((ToBits(quadrant) & 1) | ToBits(one)) == one);
 }
 template <class L>
-QX_INLINE L Signed(L value, typename L::Bits quadrant) {
-    return L::ofBits(value.bits() ^ ((quadrant << 62) & L::signBit));
+QX_INLINE L Signed(L value, BitsOf<L> quadrant) {
+    return OfBits<L>(ToBits(value) ^ ((quadrant << 62) & laneSign));
 }
 
 template <class L>
@@ -154,11 +149,11 @@ struct SineAndCosine {
     L sine, cosine;
 };
 template <class L>
-QX_INLINE SineAndCosine<L> SineCosine(L x, typename L::Mask &rare) {
+QX_INLINE SineAndCosine<L> SineCosine(L x, LaneMask<L> &rare) {
     const ReducedAngle<L> angle = Reduced(x, rare);
     const L sine = SinePolynomial(angle), cosine = CosinePolynomial(angle);
-    const typename L::Mask isOdd = IsOdd(angle.quadrant);
-    const typename L::Bits quadrant = angle.quadrant.bits();
+    const LaneMask<L> isOdd = IsOdd(angle.quadrant);
+    const BitsOf<L> quadrant = ToBits(angle.quadrant);
     return {Signed(Select(isOdd, cosine, sine), quadrant),
             Signed(Select(isOdd, sine, cosine), quadrant ^ (quadrant << 1))};
 }
@@ -174,8 +169,8 @@ QX_INLINE LanePair<L> ProductByPiece(L c, L x) {
 template <class L>
 QX_INLINE LanePair<L> FirstQuadrant(L y, L x) {
     const L zero(0.0);
-    const typename L::Mask below[4] = {y < L(0.4375) * x, y < L(0.6875) * x, y < L(1.1875) * x,
-                                       y < L(2.4375) * x};
+    const LaneMask<L> below[4] = {y < L(0.4375) * x, y < L(0.6875) * x, y < L(1.1875) * x,
+                                  y < L(2.4375) * x};
     LanePair<L> angle = {L(0x1.f730bd281f69bp-1), L(0x1.007887af0cbbdp-56)};
     L c(1.5);
     angle = Select(below[2], {L(0x1.921fb54442d18p-1), L(0x1.1a62633145c07p-55)}, angle);
@@ -185,7 +180,7 @@ QX_INLINE LanePair<L> FirstQuadrant(L y, L x) {
     angle = Select(below[0], {zero, zero}, angle);
     c = Select(below[0], zero, c);
 
-    const typename L::Mask isSteep = !below[3];
+    const LaneMask<L> isSteep = !below[3];
     angle = Select(isSteep, {L(0x1.921fb54442d18p+0), L(0x1.1a62633145c07p-54)}, angle);
     const LanePair<L> ofX = ProductByPiece(c, x), ofY = ProductByPiece(c, y);
     const LanePair<L> top =
@@ -206,15 +201,15 @@ QX_INLINE LanePair<L> FirstQuadrant(L y, L x) {
 }
 
 template <class L>
-QX_INLINE L ArcTangent(L y, L x, typename L::Mask &rare) {
+QX_INLINE L ArcTangent(L y, L x, LaneMask<L> &rare) {
     const L height = Magnitude(y), width = Magnitude(x), zero(0.0);
-    const typename L::Mask isHigh = width < height;
+    const LaneMask<L> isHigh = width < height;
     const L larger = Select(isHigh, height, width), smaller = Select(isHigh, width, height);
     // NaN is neither below nor above. Powers of 2 by whole factors have no rounding here.
     const L power = PowerOfTwo(larger);
     rare = rare | !(larger < L(0x1p1000)) | !(L(0x1p-900) <= larger) | (height == width) |
            !(power * L(0x1p-64) <= PowerOfTwo(smaller)) | !(zero < smaller);
-    const L scale = L::ofBits(0x7fe0000000000000 - power.bits()); // 1 / power
+    const L scale = OfBits<L>(0x7fe0000000000000 - ToBits(power)); // 1 / power
     const LanePair<L> quadrant = FirstQuadrant(height * scale, width * scale);
     const LanePair<L> halfTurn = {L(0x1.921fb54442d18p+1), L(0x1.1a62633145c07p-53)};
     const LanePair<L> angle =
@@ -235,19 +230,18 @@ struct LaneSquare {
 };
 
 template <class L>
-QX_INLINE L Hypotenuse(L x, L y, typename L::Mask &rare) {
+QX_INLINE L Hypotenuse(L x, L y, LaneMask<L> &rare) {
     const L width = Magnitude(x), height = Magnitude(y), zero(0.0);
-    const typename L::Mask isHigh = width < height;
+    const LaneMask<L> isHigh = width < height;
     const L larger = Select(isHigh, height, width), smaller = Select(isHigh, width, height);
-    const typename L::Mask isZero = smaller == zero;
+    const LaneMask<L> isZero = smaller == zero;
     rare = rare | !(larger < L(0x1p511)) | !((L(0x1p-450) <= smaller) | isZero);
-    const typename L::Mask isTiny = PowerOfTwo(smaller) * L(0x1p64) < PowerOfTwo(larger);
+    const LaneMask<L> isTiny = PowerOfTwo(smaller) * L(0x1p64) < PowerOfTwo(larger);
     const LaneSquare<L> big(larger), little(smaller);
     const L root = Sqrt(little.lo + big.lo + little.hi + big.hi);
     return Select(isTiny | isZero, larger + smaller, root);
 }
 
-} // inline namespace
 } // namespace qx
 
 #endif

@@ -1,0 +1,102 @@
+#ifndef QX_FRAME_LANE_MASKS_H
+#define QX_FRAME_LANE_MASKS_H
+
+#include "frame/lanes.h"
+
+#include <cstdint>
+#include <immintrin.h>
+
+namespace qx {
+
+// Comparisons of lanes, choices by them, and the bits of numbers, for Lanes<2> and Lanes<4>.
+
+template <int N>
+struct LaneInteger;
+template <>
+struct LaneInteger<2> {
+    typedef int64_t type __attribute__((vector_size(16)));
+};
+template <>
+struct LaneInteger<4> {
+    typedef int64_t type __attribute__((vector_size(32)));
+};
+
+template <class L>
+using BitsOf = typename LaneInteger<L::count>::type;
+
+constexpr int64_t laneSign = INT64_MIN;
+
+template <int N>
+QX_INLINE typename LaneInteger<N>::type ToBits(Lanes<N> x) {
+    return (typename LaneInteger<N>::type)x.v;
+}
+template <class L>
+QX_INLINE L OfBits(BitsOf<L> bits) {
+    return L((typename L::Vector)bits);
+}
+template <int N>
+QX_INLINE Lanes<N> Magnitude(Lanes<N> x) {
+    return OfBits<Lanes<N>>(ToBits(x) & ~laneSign);
+}
+template <int N>
+QX_INLINE Lanes<N> CopySign(Lanes<N> magnitude, Lanes<N> sign) {
+    return OfBits<Lanes<N>>((ToBits(magnitude) & ~laneSign) | (ToBits(sign) & laneSign));
+}
+template <int N>
+QX_INLINE Lanes<N> Sqrt(Lanes<N> x) {
+    Lanes<N> root;
+    for (int i = 0; i < N; ++i)
+        root.v[i] = __builtin_sqrt(x.v[i]);
+    return root;
+}
+
+// A truth for each lane. Comparisons with NaN are false.
+template <class L>
+struct LaneMask {
+    BitsOf<L> m; // all bits of a lane, or none
+};
+
+template <int N>
+QX_INLINE LaneMask<Lanes<N>> operator<(Lanes<N> a, Lanes<N> b) {
+    return {(BitsOf<Lanes<N>>)(a.v < b.v)};
+}
+template <int N>
+QX_INLINE LaneMask<Lanes<N>> operator<=(Lanes<N> a, Lanes<N> b) {
+    return {(BitsOf<Lanes<N>>)(a.v <= b.v)};
+}
+template <int N>
+QX_INLINE LaneMask<Lanes<N>> operator==(Lanes<N> a, Lanes<N> b) {
+    return {(BitsOf<Lanes<N>>)(a.v == b.v)};
+}
+template <class L>
+QX_INLINE LaneMask<L> operator&(LaneMask<L> a, LaneMask<L> b) {
+    return {a.m & b.m};
+}
+template <class L>
+QX_INLINE LaneMask<L> operator|(LaneMask<L> a, LaneMask<L> b) {
+    return {a.m | b.m};
+}
+template <class L>
+QX_INLINE LaneMask<L> operator!(LaneMask<L> a) {
+    return {~a.m};
+}
+template <class L>
+QX_INLINE L Select(LaneMask<L> where, L a, L b) {
+    return L(where.m ? a.v : b.v);
+}
+template <class L>
+QX_INLINE bool Any(LaneMask<L> a) {
+    if constexpr (L::count == 2)
+        return _mm_movemask_pd((__m128d)a.m) != 0;
+#ifdef __AVX2__
+    else
+        return _mm256_movemask_pd((__m256d)a.m) != 0;
+#else
+    else
+        return (a.m[0] | a.m[1] | a.m[2] | a.m[3]) != 0;
+#endif
+}
+
+} // namespace qx
+
+#endif
