@@ -98,7 +98,6 @@ ErrorCode ToneSearch::reserveSpectrum() {
     plan_.emplace(static_cast<int32_t>(length));
     if (!*plan_)
         return ErrOutOfMemory;
-    spectrumLength_ = static_cast<int32_t>(length);
 
     // Von Hann's, without zeros at its ends: what 0 leaves of its negative.
     const Line wave = {1.0 / n_, -0.5, 0, 0};
@@ -108,11 +107,12 @@ ErrorCode ToneSearch::reserveSpectrum() {
         return failed;
     window.begin(window_.data(), n_);
     window.residualOf(&wave, 1, -0.5, window_.data());
+    spectrumLength_ = static_cast<int32_t>(length);
     return 0;
 }
 
 // The mean power of noise: its powers have an exponential distribution, whose median is ln 2 of its
-// mean. The powers are spoiled; of many, some thousands do.
+// mean. Of many powers every so many are taken. The spectrum is lost.
 double ToneSearch::noiseOf(const DBL *power, int32_t count) {
     constexpr double medianOfMean = 0.6931471805599453;
     constexpr int32_t enough = 1 << 15;
