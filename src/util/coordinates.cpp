@@ -7,6 +7,7 @@
 
 #include <algorithm>
 #include <cmath>
+#include <cstring>
 
 namespace qx {
 
@@ -249,6 +250,11 @@ void Products(const DBL *x, const DBL *y, int32_t n, DBL *products) {
         products[i] = x[i] * y[i];
 }
 
+// At any address, which std::copy does not promise.
+void CopyColumn(const DBL *x, int32_t n, DBL *y) {
+    std::memcpy(y, x, sizeof(DBL) * static_cast<std::size_t>(n));
+}
+
 // Of a block of n points; the results lie apart from them.
 typedef const DBL *const *From;
 typedef DBL *const *To;
@@ -256,14 +262,14 @@ typedef DBL *const *To;
 void CartesianToCylindrical(From p, int32_t n, To q) {
     Hypotenuses(p[0], p[1], n, q[0]);
     Azimuths(p[1], p[0], n, q[1]);
-    std::copy(p[2], p[2] + n, q[2]);
+    CopyColumn(p[2], n, q[2]);
 }
 void CylindricalToCartesian(From p, int32_t n, To q) {
     Column sines, cosines;
     SinesAndCosines(p[1], n, sines, cosines);
     Products(p[0], cosines, n, q[0]);
     Products(p[0], sines, n, q[1]);
-    std::copy(p[2], p[2] + n, q[2]);
+    CopyColumn(p[2], n, q[2]);
 }
 void CylindricalToSpherical(From p, int32_t n, To q) {
     Column fromAxis;
@@ -315,7 +321,7 @@ void SphericalToCartesian(From p, int32_t n, To q) {
 }
 void Copied(From p, int32_t n, To q) {
     for (int k = 0; k < 3; ++k)
-        std::copy(p[k], p[k] + n, q[k]);
+        CopyColumn(p[k], n, q[k]);
 }
 
 } // namespace
