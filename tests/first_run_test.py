@@ -1,5 +1,5 @@
 """What a new user sees of the set-up and the first build: what is missing, how far it is, why it fails,
-and that it ends when it is told to.
+that it ends when it is told to, and that it builds from the pinned sources and no others.
 
     first_run_test.py SOURCE [TEST...]
 
@@ -34,6 +34,9 @@ def machine_cache():
     script = f'. "{SOURCE}/tools/setup/common.sh"; echo "$CACHE"'
     return Path(subprocess.run(["bash", "-c", script], capture_output=True, text=True,
                                check=True).stdout.strip())
+
+
+SOURCES = Path(os.environ.get("QX_SOURCES", machine_cache() / "sources"))
 
 
 def processes_with(text):
@@ -92,7 +95,8 @@ class Case(unittest.TestCase):
         self.cache = self.folder / "cache"
         self.environment = {**os.environ, "PATH": f"{self.programs}:{os.environ['PATH']}",
                             "QX_CACHE": str(self.cache)}
-        self.environment.pop("QX_WATCHED", None)
+        for name in ("QX_WATCHED", "QX_SOURCES"):
+            self.environment.pop(name, None)
 
     def program(self, name, text):
         """A program of this name that is found before the machine's."""
@@ -104,13 +108,20 @@ class Case(unittest.TestCase):
         """What the machine has of these is there from the start."""
         self.cache.mkdir(exist_ok=True)
         for name in names:
-            (self.cache / name).symlink_to(machine_cache() / name)
+            (self.cache / name).symlink_to(SOURCES if name == "sources" else machine_cache() / name)
 
     def fresh_copy(self):
         copy = self.folder / "copy"
         shutil.copytree(SOURCE, copy, symlinks=True,
                         ignore=shutil.ignore_patterns("build", "out", ".git", "__pycache__"))
         return copy
+
+    def copied_setup(self):
+        """What the scripts of the set-up consist of."""
+        copy = self.folder / "copy"
+        for part in ("tools/setup", "src/mathlib"):
+            shutil.copytree(SOURCE / part, copy / part)
+        return copy / "tools/setup"
 
     def run_script(self, *command):
         return subprocess.run(list(map(str, command)), capture_output=True, text=True,
@@ -140,7 +151,7 @@ class Missing(Case):
         self.assertEqual(ran.returncode, 1)
         self.assertIn("E: Could not resolve", ran.stderr)
         self.assertRegex(self.last_line(ran),
-                         r"source package musl is needed and cannot be fetched.*source-musl\.log")
+                         r"source package musl \S+ is needed and cannot be fetched.*source-musl\.log")
         self.program("dpkg-query", "exit 1")
         self.program("dpkg", "exit 0")
         self.program("id", "echo 0")
@@ -149,7 +160,7 @@ class Missing(Case):
         self.assertRegex(self.last_line(ran), r"installing packages failed: .*apt-install\.log")
 
     def test_no_network_is_needed_where_the_cache_has_all(self):
-        self.take_from_cache("src", "lapack", "openblas", "libm")
+        self.take_from_cache("lapack", "openblas", "libm")
         self.program("apt-get", "echo 'E: Could not resolve'; exit 100")
         for script in ("native", "libm", "lapack", "openblas"):
             ran = self.run_script(SOURCE / "tools/setup" / script, *["linux"] * (script != "native"))
@@ -159,7 +170,7 @@ class Missing(Case):
 class Failing(Case):
     def setUp(self):
         super().setUp()
-        self.take_from_cache("src")
+        self.take_from_cache("sources")
         for name in ("gfortran", "gcc"):
             self.program(name, f'[ "$1" = -dumpfullversion ] && exec /usr/bin/{name} "$1"\n'
                          "echo 'x:1:1: Error: made up' >&2; exit 1")
@@ -179,7 +190,7 @@ class Failing(Case):
         ran = self.run_script(self.fresh_copy() / "run")
         self.assertEqual(ran.returncode, 1)
         self.assertIn("\nx:1:1: Error: made up\n", ran.stderr)
-        self.assertRegex(self.last_line(ran), r"\[run\] building the library failed: .*build/run\.log")
+        self.assertRegex(self.last_line(ran), r"\[run\] setting up failed: .*build/setup\.log")
 
 
 class Telling(Case):
@@ -220,7 +231,7 @@ class Stopping(Case):
         return process.returncode, output.read_text()
 
     def test_a_signal_ends_all_that_was_started(self):
-        self.take_from_cache("src")
+        self.take_from_cache("sources")
         log = self.cache / "lapack-linux.log"
         for number in (signal.SIGTERM, signal.SIGINT, signal.SIGHUP):
             status, text = self.stopped(lambda: log.exists() and re.search(r"\[\d+/\d+\]", log.read_text()),
@@ -241,16 +252,127 @@ class Stopping(Case):
         self.nothing_runs()
 
     def test_what_is_half_fetched_is_fetched_again(self):
-        half = "mkdir musl-1; touch musl-1/half; sleep 60"
-        self.program("apt-get", f'case "$*" in *source*musl) {half} ;; esac')
-        fetched = self.cache / "source.work/musl-1/half"
+        half = "touch half; sleep 60"
+        self.program("apt-get", f'case "$*" in *download-only*musl=*) {half} ;; esac')
+        fetched = self.cache / "sources.work/half"
         self.stopped(fetched.exists, lambda process: os.killpg(process.pid, signal.SIGKILL),
                      SOURCE / "tools/setup/libm", "linux")
         for line in processes_with(f"QX_CACHE={self.cache}"):
             os.kill(int(line.split(":")[0]), signal.SIGKILL)
         self.program("apt-get", "echo 'E: made up'; exit 100")
         ran = self.run_script(SOURCE / "tools/setup/libm", "linux")
-        self.assertRegex(self.last_line(ran), "musl is needed and cannot be fetched")
+        self.assertRegex(self.last_line(ran), r"musl \S+ is needed and cannot be fetched")
+        self.assertEqual(list((self.cache / "sources").iterdir()), [])
+
+
+class Pinned(Case):
+    """Only the pinned sources, with patches that apply, become libraries, and cmake makes none."""
+
+    def setUp(self):
+        super().setUp()
+        self.called = self.folder / "apt-get was called"
+        self.program("apt-get", f'touch "{self.called}"; exit 100')
+
+    def offline(self):
+        """A folder with the sources of musl."""
+        folder = self.folder / "offline"
+        folder.mkdir()
+        for path in SOURCES.glob("musl_*"):
+            shutil.copy(path, folder)
+        self.environment["QX_SOURCES"] = str(folder)
+        return folder
+
+    def refused(self, ran, *reasons):
+        self.assertEqual(ran.returncode, 1, ran.stderr)
+        for reason in reasons:
+            self.assertIn(reason, ran.stderr)
+        self.assertEqual(list(self.cache.glob("*/*/*.a")), [])
+
+    def test_other_sources_are_refused(self):
+        offline = self.offline()
+        archive = offline / "musl_1.2.3.orig.tar.gz"
+        whole = archive.read_bytes()
+        archive.write_bytes(whole[:-1] + bytes([whole[-1] ^ 1]))
+        refused = "the source of musl is refused"
+        libm = (SOURCE / "tools/setup/libm", "linux")
+        self.refused(self.run_script(*libm), f"not the pinned file: {archive}", refused)
+        archive.unlink()
+        self.refused(self.run_script(*libm), f"missing: {archive}", refused)
+        self.assertFalse(self.called.exists(), "the folder stands for the network")
+        # Fetched ones, too; what was fetched does not stay.
+        archive.write_bytes(whole[:-1])
+        del self.environment["QX_SOURCES"]
+        self.program("apt-get", f'case "$*" in *download-only*) cp "{offline}"/* . ;; esac')
+        self.refused(self.run_script(*libm), "not the pinned file", "cannot be fetched")
+        self.assertEqual(list((self.cache / "sources").iterdir()), [])
+
+    def test_what_is_not_pinned_is_refused(self):
+        setup = self.copied_setup()
+        self.take_from_cache("sources")
+        lock = setup / "sources.lock"
+        lock.write_text(re.sub(r"^musl .*\n", "", lock.read_text(), flags=re.MULTILINE))
+        self.refused(self.run_script(setup / "libm", "linux"), "musl is not pinned in")
+
+    def test_a_patch_must_apply(self):
+        setup = self.copied_setup()
+        self.take_from_cache("sources")
+        patch = setup / "patches/openblas/no-single-precision.patch"
+        text = patch.read_text()
+        # A line around the change is another one: patch would allow for it.
+        patch.write_text(text.replace("   double (*ddot_k)", "   double (*ddot_x)"))
+        self.assertNotEqual(patch.read_text(), text)
+        self.refused(self.run_script(setup / "openblas", "linux"), "FAILED",
+                     "no-single-precision.patch does not apply to openblas")
+
+    def test_two_at_once_build_once_from_a_folder(self):
+        self.offline()
+        command = [SOURCE / "tools/setup/libm", "linux"]
+        self.assertEqual(self.run_script(*command, "find").returncode, 1)
+        both = [subprocess.Popen(list(map(str, command)), env=self.environment, text=True,
+                                 stdout=subprocess.PIPE, stderr=subprocess.PIPE) for _ in range(2)]
+        shown = [process.communicate() for process in both]
+        self.assertEqual([process.returncode for process in both], [0, 0], shown)
+        self.assertEqual(shown[0][0], shown[1][0])
+        told = shown[0][1] + shown[1][1]
+        self.assertEqual(told.count("building the mathematics library for linux"), 1, told)
+        self.assertFalse(self.called.exists())
+        archive = Path(shown[0][0].strip())
+        self.assertEqual(self.run_script(*command, "find").stdout.strip(), str(archive))
+        built = Path(subprocess.run([*command, "find"], capture_output=True, text=True).stdout.strip())
+        self.assertEqual(archive.read_bytes(), built.read_bytes(), "the machine's own")
+        self.assertIn("Permission is hereby granted", (archive.parent / "licences/COPYRIGHT").read_text())
+
+    def test_whatever_the_bits_rest_on_is_in_the_name(self):
+        self.take_from_cache("libm")
+        setup = self.copied_setup()
+
+        def found():
+            return self.run_script(setup / "libm", "linux", "find").returncode == 0
+
+        def changed(path, old, new):
+            text = path.read_text() if path.exists() else None
+            path.parent.mkdir(parents=True, exist_ok=True)
+            path.write_text(text.replace(old, new) if text else new)
+            self.assertNotEqual(path.read_text(), text)
+            self.assertFalse(found(), path)
+            path.write_text(text) if text else path.unlink()
+            self.assertTrue(found(), path)
+
+        self.assertTrue(found())
+        changed(setup / "libm", "-O2", "-O1")
+        changed(setup / "sources.lock", "musl 1.2.3-1 24", "musl 1.2.3-1 25")
+        changed(setup / "patches/musl/more.patch", "", "a patch")
+        changed(setup.parent.parent / "src/mathlib/atan2.c", "{", "{ ")
+        self.program("gcc", "echo 12.9.0")
+        self.assertFalse(found())
+
+    def test_cmake_only_looks(self):
+        copy = self.fresh_copy()
+        ran = self.run_script("cmake", "-S", copy, "--preset", "release")
+        self.assertNotEqual(ran.returncode, 0)
+        self.assertRegex(re.sub(r"\s+", " ", ran.stderr), r"is not built yet \(libm for linux\): run \./setup in")
+        self.assertFalse(self.called.exists())
+        self.assertEqual([path for path in self.cache.rglob("*") if path.is_file()], [])
 
 
 class OnATerminal(Case):
@@ -263,7 +385,7 @@ class OnATerminal(Case):
         self.assertRegex(shown, r"work: \d s \[1/3\]")
         self.assertRegex(shown, r"work: failed in \d s")
 
-    def ended_by_ctrl_c(self, terminal, reached):
+    def ended_by_ctrl_c(self, terminal, reached, stage):
         """Ends the first run where the pattern is shown."""
         self.assertRegex(terminal.read(until=reached), reached)
         time.sleep(1)
@@ -275,19 +397,20 @@ class OnATerminal(Case):
         self.assertLess(time.monotonic() - started, PROMPT)
         self.assertEqual(terminal.close(), -signal.SIGINT)
         lines = [line for line in re.split(r"[\r\n]+", shown.replace("^C", ""))
-                 if line.strip() and not line.startswith("building the library:")]
+                 if line.strip() and not line.startswith(f"{stage}:")]
         self.assertEqual(len(lines), 1, shown)
-        self.assertRegex(lines[0], r"^\[run\] stopped after \d+ s of building the library")
+        self.assertRegex(lines[0], rf"^\[run\] stopped after \d+ s of {stage}")
         self.nothing_runs()
 
     def test_ctrl_c_ends_the_first_run(self):
         copy = self.fresh_copy()
-        self.take_from_cache("src", "libm")
-        self.ended_by_ctrl_c(Terminal(copy / "run", env=self.environment), r"\[lapack\]")
+        self.take_from_cache("sources", "libm")
+        self.ended_by_ctrl_c(Terminal(copy / "run", env=self.environment), r"\[lapack\]", "setting up")
         self.assertEqual(list(self.cache.glob("lapack/*/*.a")), [])
         shutil.rmtree(self.cache)
-        self.take_from_cache("src", "libm", "lapack", "openblas")
-        self.ended_by_ctrl_c(Terminal(copy / "run", env=self.environment), r" \[[1-9]\d*/\d{3}\]")
+        self.take_from_cache("sources", "libm", "lapack", "openblas")
+        self.ended_by_ctrl_c(Terminal(copy / "run", env=self.environment), r" \[[1-9]\d*/\d{3}\]",
+                             "building the library")
 
 
 if __name__ == "__main__":

@@ -7,7 +7,6 @@
 #   show_failure LOG            the lines of a log that tell why a build failed
 #   lock_cache NAME             waits until no other script holds this lock
 #   need_commands "PACKAGE..." COMMAND...   installs the packages where a command is missing
-#   debian_source PACKAGE       sets `source` to the folder of the unpacked Debian source package
 
 CACHE=${QX_CACHE:-${XDG_CACHE_HOME:-${HOME:-/root}/.cache}/qxanalysis}
 mkdir -p "$CACHE"
@@ -26,7 +25,7 @@ fail() {
 # at, or what a set-up script says.
 progress() {
     tail -c 4096 "$1" | grep -aoE \
-        -e '^\[([0-9]+/[0-9]+\]|(libm|lapack|openblas|native|run)\].{1,60})' \
+        -e '^\[([0-9]+/[0-9]+\]|(libm|lapack|openblas|native|setup|run)\].{1,60})' \
         -e '^ *[0-9]+/[0-9]+ Test +#[0-9]+: [^ ]+' \
         -e '^(Get:[0-9]+|(Unpacking|Setting up|I: [A-Z][a-z]+ing) [^ ]+)' | tail -n 1 || true
 }
@@ -135,61 +134,6 @@ need_commands() {
     [ "$(id -u)" = 0 ] || fail "missing:$missing. As root: apt-get update && apt-get install $packages"
     # shellcheck disable=SC2086
     install_packages $packages
-}
-
-# The machine's own Debian sources as source-package lines, Signed-By included, in a folder of
-# their own: neither the machine's lists nor its sources are touched, and no root is needed.
-debian_source_lists() {
-    local folder=$1 list
-    mkdir -p "$folder/parts" "$folder/lists/partial" "$folder/cache"
-    for list in /etc/apt/sources.list /etc/apt/sources.list.d/*.list; do
-        [ -f "$list" ] && sed -En '/debian/s/^deb(-src)? /deb-src /p' "$list"
-    done | sort -u >"$folder/parts/debian.list"
-    : >"$folder/parts/debian.sources"
-    for list in /etc/apt/sources.list.d/*.sources; do
-        [ -f "$list" ] || continue
-        grep -v '^#' "$list" | awk 'BEGIN { RS = ""; ORS = "\n\n" } /URIs:[^\n]*debian/' |
-            sed 's/^Types:.*/Types: deb-src/' >>"$folder/parts/debian.sources"
-    done
-    [ -s "$folder/parts/debian.list" ] || [ -s "$folder/parts/debian.sources" ] ||
-        fail "no Debian source among /etc/apt/sources.list*, so no source package can be fetched"
-}
-
-# One package at a time, for they share apt's lists.
-debian_source() {
-    local package=$1
-    source="$CACHE/src/$package"
-    [ ! -f "$source/.complete" ] || return 0
-    lock_cache source 8
-    if [ ! -f "$source/.complete" ]; then
-        need_commands "dpkg-dev" dpkg-source
-        note "fetching the source package $package"
-        if ! watched "fetching $package" "$CACHE/source-$package.log" fetch_source "$package"; then
-            show_failure "$CACHE/source-$package.log"
-            fail "Debian's source package $package is needed and cannot be fetched (no network?): see" \
-                "$CACHE/source-$package.log, or copy $CACHE/src from another machine"
-        fi
-    fi
-    exec 8>&-
-}
-
-# The mark of completeness is the last to be written: what a killed run leaves is made anew.
-fetch_source() {
-    local package=$1 apt="$CACHE/apt-source" work="$CACHE/source.work" unpacked
-    debian_source_lists "$apt" || return
-    local options=(-o Dir::Etc::sourcelist=/dev/null -o "Dir::Etc::sourceparts=$apt/parts"
-        -o "Dir::State::lists=$apt/lists" -o "Dir::Cache=$apt/cache"
-        -o APT::Sandbox::User= -o APT::Get::List-Cleanup=false -o Acquire::Languages=none
-        -o Acquire::Retries=3 -o DPkg::Lock::Timeout=60)
-    rm -rf "$work"
-    mkdir -p "$work" "$CACHE/src"
-    (cd "$work" && apt-get "${options[@]}" update && apt-get "${options[@]}" source "$package") || return
-    unpacked=$(find "$work" -mindepth 1 -maxdepth 1 -type d | head -n 1)
-    [ -n "$unpacked" ] || fail "the source package $package holds no folder"
-    dpkg-parsechangelog -l "$unpacked/debian/changelog" -S Version >"$unpacked/.version" || return
-    rm -rf "$CACHE/src/$package" && mv "$unpacked" "$CACHE/src/$package" &&
-        touch "$CACHE/src/$package/.complete"
-    rm -rf "$work"
 }
 
 # The mirror that the machine itself installs from.

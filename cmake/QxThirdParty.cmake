@@ -1,0 +1,33 @@
+# The libraries that the module carries: the mathematics library, LAPACK and BLAS. ./setup builds them
+# from pinned sources with one compiler and one set of flags for every configuration of a target, so
+# that every export gives the same bits in all of them; here they are only looked for.
+if(WIN32)
+    set(QX_SETUP_TARGET i686-mingw)
+    set(setup "./setup win32")
+else()
+    set(QX_SETUP_TARGET linux)
+    set(setup "./setup")
+endif()
+# What is looked for depends on all of these.
+file(GLOB recipes CONFIGURE_DEPENDS ${PROJECT_SOURCE_DIR}/tools/setup/*
+    ${PROJECT_SOURCE_DIR}/tools/setup/patches/*/*.patch ${PROJECT_SOURCE_DIR}/src/mathlib/*.[ch])
+list(FILTER recipes EXCLUDE REGEX "/patches$")
+set_property(DIRECTORY APPEND PROPERTY CMAKE_CONFIGURE_DEPENDS ${recipes})
+
+foreach(library IN ITEMS libm lapack openblas)
+    execute_process(COMMAND ${PROJECT_SOURCE_DIR}/tools/setup/${library} ${QX_SETUP_TARGET} find
+        OUTPUT_VARIABLE archive OUTPUT_STRIP_TRAILING_WHITESPACE RESULT_VARIABLE missing)
+    if(missing)
+        message(FATAL_ERROR "What the module carries is not built yet (${library} for "
+            "${QX_SETUP_TARGET}): run ${setup} in ${PROJECT_SOURCE_DIR}")
+    endif()
+    add_library(qx${library} STATIC IMPORTED GLOBAL)
+    cmake_path(GET archive PARENT_PATH folder)
+    set_target_properties(qx${library} PROPERTIES IMPORTED_LOCATION ${archive})
+    set(QX_FOLDER_${library} ${folder})
+endforeach()
+# Only src/linalg/lapack.cpp includes the headers of LAPACK and BLAS.
+set_target_properties(qxlapack PROPERTIES INTERFACE_INCLUDE_DIRECTORIES ${QX_FOLDER_lapack}/include)
+# The core has what compiled Fortran asks for.
+target_link_libraries(qxlapack INTERFACE qxopenblas qxcore)
+target_link_libraries(qxopenblas INTERFACE qxlibm)
