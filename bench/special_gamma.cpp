@@ -3,8 +3,8 @@
 #include "special/beta.h"
 #include "special/digamma.h"
 #include "special/factorial.h"
-#include "stats/distributions.h"
 #include "special/gamma.h"
+#include "stats/distributions.h"
 
 #include <cmath>
 

@@ -95,10 +95,9 @@ class Array1D {
 public:
     explicit Array1D(int32_t n = 0) : handle_(owned(QXHostNew1D(code, n))) {}
     explicit Array1D(std::span<const T> values)
-        : handle_(owned(
-              values.size() <= INT32_MAX
-                  ? QXHostCopy1D(code, static_cast<int32_t>(values.size()), values.data())
-                  : nullptr)) {}
+        : handle_(owned(values.size() <= INT32_MAX
+                            ? QXHostCopy1D(code, static_cast<int32_t>(values.size()), values.data())
+                            : nullptr)) {}
     Array1D(std::initializer_list<T> values)
         : Array1D(std::span<const T>(values.begin(), values.size())) {}
     Array1D(Array1D &&other) noexcept : handle_(std::exchange(other.handle_, nullptr)) {}

@@ -80,8 +80,8 @@ double AtStart(const DBL *x, int32_t rule, int32_t rest, double h) {
 }
 
 ErrorCode CheckLowerRule(int32_t n, int32_t rule) {
-    return FirstFailed(
-        {{rule < Trapezoid || rule > Bode, ErrInvalidSelector}, {n < int64_t{rule} + 2, ErrSizesDisagree}});
+    return FirstFailed({{rule < Trapezoid || rule > Bode, ErrInvalidSelector},
+                        {n < int64_t{rule} + 2, ErrSizesDisagree}});
 }
 
 // kept: here the count is checked first, also against a rule that does not exist.

@@ -3,10 +3,10 @@
 #include "frame/constants.h"
 #include "special/digamma.h"
 #include "special/extended.h"
+#include "special/gamma.h"
 #include "special/logarithms.h"
 #include "special/rational.h"
 #include "special/reciprocal_gamma.h"
-#include "special/gamma.h"
 
 #include <cmath>
 

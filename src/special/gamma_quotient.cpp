@@ -2,8 +2,8 @@
 
 #include "frame/constants.h"
 #include "special/extended.h"
-#include "special/reciprocal_gamma.h"
 #include "special/gamma.h"
+#include "special/reciprocal_gamma.h"
 
 #include <cmath>
 

@@ -128,7 +128,8 @@ TEST(InverseChirpZ, GivesBackTheSequence) {
         EXPECT_LT(ErrorOfInverse(n, one, OnCircle(-1.0L / n)), 3e-12) << n;
     EXPECT_LT(ErrorOfInverse(30, {0.9, 0.3}, OnCircle(1.0L / 30)), 3.3e-13);
     EXPECT_LT(ErrorOfInverse(12, {1.1, -0.2}, {0.9, -0.5}), 4e-14);
-    EXPECT_LT(ErrorOfInverse(8, one, OnCircle(-0.05L)), 3.4e-12) << "an arc of less than half a turn";
+    EXPECT_LT(ErrorOfInverse(8, one, OnCircle(-0.05L)), 3.4e-12)
+        << "an arc of less than half a turn";
 }
 
 // Products of thousands of differences leave the range of double; what they make up does not.
