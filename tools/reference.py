@@ -22,7 +22,7 @@ from pathlib import Path
 
 ROOT = Path(__file__).resolve().parent.parent
 sys.path.insert(0, str(ROOT / "python"))
-from qx.report import COMMON_STYLE, HEAD  # noqa: E402
+from qx.pages import COMMON_STYLE, HEAD  # noqa: E402
 
 STYLE = """
 h1 { font-size: 1.6em; } h2 { font-size: 1.2em; border-bottom: 1px solid var(--line); margin-top: 2em; }
@@ -120,8 +120,8 @@ class ExampleError(Exception):
 def examples(path):
     """The parts of an example file, what stands before the first one included: title, source,
     output, figures as SVG."""
-    from qx import report
-    plt = report._pyplot()
+    from qx import drawing
+    plt = drawing.pyplot()
     pieces = re.split(r"^#%% *(.*)\n", path.read_text("utf-8"), flags=re.MULTILINE)
     names = {"__name__": "example"}
     line = 0
@@ -132,7 +132,7 @@ def examples(path):
                 exec(compile("\n" * line + source, str(path), "exec"), names)
         except Exception as error:
             raise ExampleError(f"{path}: '{title}': {traceback.format_exc()}") from error
-        figures = [report._svg(plt, plt.figure(number)) for number in plt.get_fignums()]
+        figures = [drawing.svg(plt, plt.figure(number)) for number in plt.get_fignums()]
         yield title, source.strip(), output.getvalue().rstrip(), figures
         line += source.count("\n") + 1
 

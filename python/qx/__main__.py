@@ -1,6 +1,7 @@
 """The command line: python3 -m qx COMMAND; the commands stand in qx/commands."""
 
 import argparse
+import io
 import os
 import sys
 
@@ -31,7 +32,8 @@ def arguments(argv):
 def main(argv=None):
     options = arguments(argv)
     for stream in (sys.stdout, sys.stderr):
-        stream.reconfigure(errors="replace")
+        if isinstance(stream, io.TextIOWrapper):  # and no stand-in
+            stream.reconfigure(errors="replace")
     try:
         options.run(options)
         sys.stdout.flush()

@@ -46,6 +46,7 @@ class _Memory:
     """What shows memory to NumPy and does not own it."""
 
     __slots__ = ("__array_interface__",)
+    __array_interface__: dict
 
 
 class Block:
@@ -167,7 +168,8 @@ class Kind:
         """A list of tuples as an array of records. NumPy itself would put a number into every field."""
         names = self.dtype.names
         for row in value if isinstance(value, (list, tuple)) else [value]:
-            if not isinstance(row, (tuple, list, np.void)) or len(row) != len(names):
+            if not isinstance(row, (tuple, list, np.void)) or (
+                    len(row) != len(names)):  # type: ignore[arg-type]  # np.void has a length
                 raise TypeError(f"{place}: a list of tuples ({', '.join(names)}) is needed; {came(row)} came")
         return np.array([tuple(row) for row in value], self.dtype)
 

@@ -5,7 +5,8 @@ import math
 
 import numpy as np
 
-from . import outputs, report
+from . import drawing, outputs, pages
+from .sections import Row, Section, number, resolved
 
 POINTS = 4000
 FLOOR = -200.0  # dB
@@ -30,7 +31,7 @@ def page(title, section):
     return (f'<!DOCTYPE html>\n<html lang="en"><head><meta charset="utf-8">'
             f'<meta name="viewport" content="width=device-width">{outputs.generator("design")}'
             f"<title>{html.escape(title)}</title>"
-            f"<style>{report.COMMON_STYLE} td {{ padding: .1em 1.2em .1em 0; }}</style></head><body>"
+            f"<style>{pages.COMMON_STYLE} td {{ padding: .1em 1.2em .1em 0; }}</style></head><body>"
             f"<h1>{html.escape(title)}</h1>{figures}<table>{rows}</table></body></html>\n")
 
 
@@ -52,24 +53,24 @@ def described(filter_, frequencies, rate):
     coefficients = sum(len(b) + len(a) - 1 for b, a in filter_.sections)
     kind = (f"{coefficients} taps" if filter_.is_fir() else
             f"{len(filter_.sections)} sections, {coefficients} coefficients")
-    crossings = report.resolved(rate * half_power(frequencies, gain), rate * frequencies[1])
+    crossings = resolved(rate * half_power(frequencies, gain), rate * frequencies[1])
     passed = np.abs(gain) > 0.5 ** 0.5 * np.abs(gain).max()
     delays = delay[passed & np.isfinite(delay)]
-    rows = [report.Row("Filter", kind + (", " + filter_.note if filter_.note else ""), "",
-                       filter_.export),
-            report.Row("Stable", "yes" if filter_.is_stable() else "NO", "", "roots"),
-            report.Row("Half power at", ", ".join(crossings) or "no frequency", unit, ""),
-            report.Row("Least gain", report.number(decibels(gain).min(), 4), "dB", ""),
-            report.Row("Greatest gain", report.number(decibels(gain).max(), 4), "dB", "")]
+    rows = [Row("Filter", kind + (", " + filter_.note if filter_.note else ""), "",
+                filter_.export),
+            Row("Stable", "yes" if filter_.is_stable() else "NO", "", "roots"),
+            Row("Half power at", ", ".join(crossings) or "no frequency", unit, ""),
+            Row("Least gain", number(decibels(gain).min(), 4), "dB", ""),
+            Row("Greatest gain", number(decibels(gain).max(), 4), "dB", "")]
     if len(delays):
-        rows.append(report.Row("Group delay of what passes",
-                               f"{report.number(delays.min(), 4)} to {report.number(delays.max(), 4)}",
-                               "samples", ""))
-    return report.Section("Filter", "", rows, figures(frequencies, gain, delay, rate, unit))
+        rows.append(Row("Group delay of what passes",
+                        f"{number(delays.min(), 4)} to {number(delays.max(), 4)}",
+                        "samples", ""))
+    return Section("Filter", "", rows, figures(frequencies, gain, delay, rate, unit))
 
 
 def figures(frequencies, gain, delay, rate, unit):
-    plt = report._pyplot()
+    plt = drawing.pyplot()
     x = rate * frequencies
     phase = np.where(np.abs(gain) < 1e-12, math.nan, np.angle(gain))
     jumps = np.flatnonzero(np.abs(np.diff(phase)) > 0.9 * math.pi) + 1
@@ -81,7 +82,7 @@ def figures(frequencies, gain, delay, rate, unit):
     drawn = []
     for name, label, at, values in curves:
         figure, axes = plt.subplots(figsize=(10, 2.8))
-        axes.plot(at, values, color=report.BLUE, linewidth=1.2)
+        axes.plot(at, values, color=drawing.BLUE, linewidth=1.2)
         axes.set(title=name, xlabel=f"Frequency ({unit})", ylabel=label)
         axes.margins(x=0.005)
         if name == "Magnitude":
@@ -93,5 +94,5 @@ def figures(frequencies, gain, delay, rate, unit):
             low, high = passed.min(), passed.max()
             room = 0.1 * (high - low) + 1e-3 * abs(high)
             axes.set_ylim(low - room, high + room)
-        drawn.append(report._svg(plt, figure))
+        drawn.append(drawing.svg(plt, figure))
     return drawn

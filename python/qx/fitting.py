@@ -207,21 +207,21 @@ def lines(result):
 
 def plot(result, path):
     """Data and fit above, residuals below; the suffix of the path says the format."""
-    from . import report
-    plt = report._pyplot()
+    from . import drawing
+    plt = drawing.pyplot()
     columns = result.columns
     order = np.argsort(columns.x, kind="stable")
     fine = np.linspace(columns.x.min(), columns.x.max(), 500)
     figure, (above, below) = plt.subplots(2, 1, figsize=(8, 5.5), sharex=True,
                                           gridspec_kw={"height_ratios": [3, 1]})
     dense = len(order) > 500
-    above.plot(columns.x, columns.y, ".", color=report.GREY, markersize=2 if dense else 5, label="data")
-    above.plot(fine, result.model.value(fine, result.parameters), color=report.BLUE, linewidth=1.6,
+    above.plot(columns.x, columns.y, ".", color=drawing.GREY, markersize=2 if dense else 5, label="data")
+    above.plot(fine, result.model.value(fine, result.parameters), color=drawing.BLUE, linewidth=1.6,
                label=result.model.formula)
     above.set(ylabel=columns.y_label)
     above.legend(frameon=False)
-    below.axhline(0, color=report.GREY, linewidth=0.8)
-    below.plot(columns.x[order], result.residuals[order], "." if dense else ".-", color=report.WARM,
+    below.axhline(0, color=drawing.GREY, linewidth=0.8)
+    below.plot(columns.x[order], result.residuals[order], "." if dense else ".-", color=drawing.WARM,
                linewidth=0.7, markersize=2 if dense else 4)
     below.set(xlabel=columns.x_label, ylabel="residual")
     os.makedirs(os.path.dirname(path) or ".", exist_ok=True)

@@ -49,8 +49,10 @@ SIGNALS = {
 
 
 # What has a frequency, by the options that say it.
-FREQUENCIES = {**dict.fromkeys(("sine", "square", "triangle", "sawtooth", "sinc", "gauss-pulse", "monopulse"),
-                               ("frequency",)), "chirp": ("frequency", "to")}
+FREQUENCIES: dict[str, tuple[str, ...]] = {
+    "chirp": ("frequency", "to"),
+    **{name: ("frequency",) for name in ("sine", "square", "triangle", "sawtooth", "sinc", "gauss-pulse",
+                                         "monopulse")}}
 
 
 def generate(options):

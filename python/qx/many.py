@@ -159,7 +159,7 @@ def _finished(executor, pairs, options, left):
 
 def index(found, left=()):
     """The page that leads to the others."""
-    from .report import HEAD, STYLE
+    from .pages import HEAD, STYLE
     escape = html.escape
     header = "".join(f"<th>{label}</th>" for label in ("Recording", "Samples", "Per second", *MAIN))
     rows = "".join(

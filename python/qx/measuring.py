@@ -94,7 +94,8 @@ def prominent_peaks(values, width, prominence=None):
         prominence = outstanding(stand)
     rounding = 64 * np.finfo(float).eps * np.abs(values).max()
     kept = stand >= max(prominence, rounding)
-    return Peaks(*vertices(values, maxima[kept], frame), stand[kept], prominence)
+    places, tops, curvatures = vertices(values, maxima[kept], frame)
+    return Peaks(places, tops, curvatures, stand[kept], prominence)
 
 
 def peaks_beyond(values, threshold, width, valleys):

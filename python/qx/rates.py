@@ -8,7 +8,7 @@ rules).
 import dataclasses
 import re
 
-SECONDS = {
+SECONDS_OF_NAMES = {
     1.0: "s sec secs second seconds sekunde sekunden seconde secondes segundo segundos secondi",
     1e-3: "ms msec msecs millis milli millisecond milliseconds millisekunde millisekunden milliseconde "
           "millisecondes",
@@ -19,7 +19,7 @@ SECONDS = {
     60.0: "min mins minute minutes minuten minutos",
     3600.0: "h hr hrs hour hours std stunde stunden heure heures hora horas",
     86400.0: "d day days tag tage jour jours dia dias"}
-SECONDS = {name: scale for scale, names in SECONDS.items() for name in names.split()}
+SECONDS = {name: scale for scale, names in SECONDS_OF_NAMES.items() for name in names.split()}
 PREFIXES = {"": 1.0, "k": 1e3, "K": 1e3, "M": 1e6, "G": 1e9, "m": 1e-3, "µ": 1e-6, "μ": 1e-6, "u": 1e-6}
 HERTZ_WORDS = {"hertz": 1.0, "kilohertz": 1e3, "megahertz": 1e6, "gigahertz": 1e9, "millihertz": 1e-3}
 
@@ -27,7 +27,7 @@ HERTZ_WORDS = {"hertz": 1.0, "kilohertz": 1e3, "megahertz": 1e6, "gigahertz": 1e
 BLANKS = " \u00a0\u2009\u202f"
 NUMBER = (rf"(?:\d{{1,3}}(?:[{BLANKS}]\d{{3}})+(?!\d)(?:[.,]\d+)?|\d+(?:[.,'’]\d+)*|[.,]\d+)"
           r"(?:[eE][-+]?\d+|\s?[x×*·]\s?10\^?[-+]?\d+)?(?![\d'’])")
-TIME = "(?:" + "|".join(sorted(map(re.escape, SECONDS), key=len, reverse=True)) + r")\b\.?"
+TIME = "(?:" + "|".join(sorted((re.escape(name) for name in SECONDS), key=len, reverse=True)) + r")\b\.?"
 SAMPLES = (r"(?:samples?|smpl?s?|points?|pts|scans?|readings?|measurements?|values?|(?:mess|abtast)?werte|"
            r"abtastungen|messungen|times|[ée]chantillons?|[ée]ch\.?|mesures?|points? de mesure|muestras|campioni)")
 PER = r"\s*(?:/|\bper\b|\bpro\b|\bpar\b|\bpor\b|\bal\b|\bje\b)\s*"
@@ -191,8 +191,8 @@ def named_in(text, habit=Habit()):
                                   bool(CONTINENTAL.search(match[0])))
             found.append(Named(match[0].strip(), tuple(1 / (n * s) if inverse else n * s for n in numbers if n
                                                        for s in scales)))
-    if not found and not taken and (match := PERHAPS.search(text)):
-        remarks.append(f"'{match[0]}' may be the sampling rate or not")
+    if not found and not taken and (perhaps := PERHAPS.search(text)):
+        remarks.append(f"'{perhaps[0]}' may be the sampling rate or not")
     return [one for one in found if not one.readings or min(one.readings) > 0], remarks
 
 

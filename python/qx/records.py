@@ -3,6 +3,7 @@
 import ctypes
 import functools
 from collections.abc import Mapping
+from typing import Any
 
 import numpy as np
 
@@ -20,17 +21,17 @@ def is_pointer(field):
 def record_type(name):
     """The ctypes structure of a record; arrays in it are handles."""
     description = library().records[name]
-    fields = []
+    fields: list[tuple[str, Any]] = []
     for field in description["fields"]:
         if "array" in field or is_pointer(field):
             fields.append((field["name"], ctypes.c_void_p))
         elif "element" in field and str(field.get("count", "1")).isdigit():
-            c_type = C_TYPES[field["element"]]
+            c_type: Any = C_TYPES[field["element"]]
             fields.append((field["name"],
                            c_type * int(field["count"]) if "count" in field else c_type))
         else:
             raise TypeError(f"records of type {name} hold more than numbers and arrays")
-    body = {"_fields_": fields}
+    body: dict[str, Any] = {"_fields_": fields}
     if description["packed"]:
         body = {"_pack_": 1, **body}
     return type(name, (ctypes.Structure,), body)

@@ -1,14 +1,16 @@
 """Numbers as ctypes takes them, refused where they would lose anything but precision."""
 
 import ctypes
+from typing import Any
 import operator
 import textwrap
 
 import numpy as np
 
-C_TYPES = {"I16": ctypes.c_int16, "I32": ctypes.c_int32, "U8": ctypes.c_uint8,
-           "U16": ctypes.c_uint16, "U32": ctypes.c_uint32, "SGL": ctypes.c_float,
-           "DBL": ctypes.c_double, "CSG": ctypes.c_float * 2, "CDB": ctypes.c_double * 2}
+C_TYPES: dict[str, Any] = {
+    "I16": ctypes.c_int16, "I32": ctypes.c_int32, "U8": ctypes.c_uint8, "U16": ctypes.c_uint16,
+    "U32": ctypes.c_uint32, "SGL": ctypes.c_float, "DBL": ctypes.c_double, "CSG": ctypes.c_float * 2,
+    "CDB": ctypes.c_double * 2}
 COMPLEX = ("CSG", "CDB")
 LIMITS = {"I16": (-2**15, 2**15 - 1), "I32": (-2**31, 2**31 - 1), "U32": (0, 2**32 - 1),
           "U8": (0, 255), "U16": (0, 65535)}

@@ -5,8 +5,10 @@ import dataclasses
 
 import numpy as np
 
-from . import design, report
+from . import design, drawing
 from .calls import call
+from .sections import Row, Section, number, quantity
+from .sections_spectra import amplitude_spectrum
 
 MAINS = (50.0, 60.0)  # Hz
 NOTCH = 1.0  # Hz to either side of the hum
@@ -28,11 +30,11 @@ def line_at(frequencies, amplitudes, frequency):
 
 def hum_of(recording):
     """The frequency of the mains and its amplitude; None where neither stands out."""
-    frequencies, amplitudes = report.amplitude_spectrum(recording)
+    frequencies, amplitudes = amplitude_spectrum(recording)
     frequencies = recording.rate * frequencies
-    found = [(line_at(frequencies, amplitudes, mains), mains) for mains in MAINS
+    lines = [(line_at(frequencies, amplitudes, mains), mains) for mains in MAINS
              if mains + 5 * NOTCH < recording.rate / 2]
-    found = [(excess, mains, line) for (line, excess), mains in found if excess > STANDS_OUT]
+    found = [(excess, mains, line) for (line, excess), mains in lines if excess > STANDS_OUT]
     if not found:
         return None
     _, mains, line = max(found)
@@ -77,48 +79,48 @@ def cleaned(recording):
     wander = values - both_ways(values, filters[:1], margin)
     what = "zeroPhaseCascadeFiltH, BWCoefs90"
     wander_rms = call("RMS_head", wander - call("Mean_head", wander))
-    rows = [report.Row(f"Wander below {WANDER:g} Hz, RMS", report.number(wander_rms, 4), recording.unit,
-                       what + ", RMS_head")]
+    rows = [Row(f"Wander below {WANDER:g} Hz, RMS", number(wander_rms, 4), recording.unit,
+                what + ", RMS_head")]
     text = "A Butterworth highpass removes what is slower than half a hertz. "
     if hum:
-        frequencies, amplitudes = report.amplitude_spectrum(
+        frequencies, amplitudes = amplitude_spectrum(
             dataclasses.replace(recording, values=after))
         rest, _ = line_at(rate * frequencies, amplitudes, hum[0])
-        rows += [report.Row(f"Hum at {hum[0]:g} Hz, before", report.number(hum[1], 4), recording.unit,
-                            "ReOXFFTH80"),
-                 report.Row(f"Hum at {hum[0]:g} Hz, after", report.number(rest, 4), recording.unit,
-                            what + ", ReOXFFTH80")]
+        rows += [Row(f"Hum at {hum[0]:g} Hz, before", number(hum[1], 4), recording.unit,
+                     "ReOXFFTH80"),
+                 Row(f"Hum at {hum[0]:g} Hz, after", number(rest, 4), recording.unit,
+                     what + ", ReOXFFTH80")]
         text += f"A Butterworth bandstop about {hum[0]:g} Hz removes the hum of the mains. "
     else:
         text += "No hum of the mains stands out of the spectrum, so none is removed. "
-    rows.append(report.Row("RMS of what is left", report.number(call("RMS_head", after), 6),
-                           recording.unit, what + ", RMS_head"))
-    return report.Section("Without hum and wander", text + "Both run forward and backward, so that "
-                          "nothing is delayed.", rows,
-                          [traces(recording, after, wander), responses(rate, filters)])
+    rows.append(Row("RMS of what is left", number(call("RMS_head", after), 6),
+                    recording.unit, what + ", RMS_head"))
+    return Section("Without hum and wander", text + "Both run forward and backward, so that "
+                   "nothing is delayed.", rows,
+                   [traces(recording, after, wander), responses(rate, filters)])
 
 
 def traces(recording, after, wander):
-    plt = report._pyplot()
+    plt = drawing.pyplot()
     n = len(after)
     count = min(n, round(SHOWN * recording.rate), 12000)
     part = slice((n - count) // 2, (n + count) // 2)
     times = recording.times()[part]
     figure, (above, below) = plt.subplots(2, 1, figsize=(10, 4.6), sharex=True)
-    above.plot(times, recording.values[part], color=report.GREY, linewidth=0.8, label="before")
-    above.plot(times, wander[part], color=report.WARM, linewidth=1.2, label="wander")
-    below.plot(times, after[part], color=report.BLUE, linewidth=0.9, label="after")
+    above.plot(times, recording.values[part], color=drawing.GREY, linewidth=0.8, label="before")
+    above.plot(times, wander[part], color=drawing.WARM, linewidth=1.2, label="wander")
+    below.plot(times, after[part], color=drawing.BLUE, linewidth=0.9, label="after")
     for axes in (above, below):
         axes.legend(frameon=False, loc="upper right")
-        axes.set_ylabel(report.quantity(recording))
+        axes.set_ylabel(quantity(recording))
         axes.margins(x=0.005)
-    above.set_title(f"{report.number(count / recording.rate, 3)} s from the middle, before and after")
+    above.set_title(f"{number(count / recording.rate, 3)} s from the middle, before and after")
     below.set_xlabel(f"Time ({recording.time_unit})")
-    return report._svg(plt, figure)
+    return drawing.svg(plt, figure)
 
 
 def responses(rate, filters):
-    plt = report._pyplot()
+    plt = drawing.pyplot()
     frequencies = np.concatenate([np.geomspace(0.01, rate / 2, 3000),
                                   *(mains + np.linspace(-5, 5, 801) for mains in MAINS)])
     frequencies = np.unique(frequencies[(frequencies > 0) & (frequencies <= rate / 2)])
@@ -126,9 +128,9 @@ def responses(rate, filters):
     gain = np.ones(len(frequencies))
     for *_, filter_ in filters:
         gain = gain * np.abs(filter_.response(frequencies / rate)) ** 2
-    axes.semilogx(frequencies, 20 * np.log10(np.maximum(gain, 1e-10)), color=report.BLUE, linewidth=1.2)
+    axes.semilogx(frequencies, 20 * np.log10(np.maximum(gain, 1e-10)), color=drawing.BLUE, linewidth=1.2)
     axes.set(title="Gain of both passes through all filters", xlabel="Frequency (Hz)",
              ylabel="Gain (dB)", ylim=(-103, 5))
     axes.xaxis.set_major_formatter(lambda value, _: f"{value:g}")
     axes.margins(x=0.005)
-    return report._svg(plt, figure)
+    return drawing.svg(plt, figure)

@@ -60,11 +60,12 @@ class Arrays:
 
     def _values(self, column, part):
         values = self.columns[column].values(part)
-        for is_wrong, what in ((np.isnan, "missing; --missing skip or --missing interpolate reads the others"),
-                               (np.isinf, "not a finite number")):
-            wrong = np.flatnonzero(is_wrong(values))
-            if len(wrong) and not (self.missing and is_wrong is np.isnan):
-                raise InputError(f"{self.path}: {self.layout.label(column)}: sample {part.start + wrong[0] + 1} is "
+        for wrong, what, left_out in (
+                (np.isnan(values), "missing; --missing skip or --missing interpolate reads the others", self.missing),
+                (np.isinf(values), "not a finite number", False)):
+            places = np.flatnonzero(wrong)
+            if len(places) and not left_out:
+                raise InputError(f"{self.path}: {self.layout.label(column)}: sample {part.start + places[0] + 1} is "
                                  f"{what}")
         return values
 

@@ -93,7 +93,7 @@ class Format:
                           "mdy" if any(int(second) > 12 for _, second, _ in dates) else self._rising(dates))
             if not self.order:
                 text = next(iter(dates.values()))
-                day, month = SLASHED.match(text)[1], SLASHED.match(text)[2]
+                day, month, _ = next(iter(dates))
                 names = "January February March April May June July August September October November December"
                 return (f"'{text}' may be {int(day)} {names.split()[int(month) - 1]} or "
                         f"{names.split()[int(day) - 1]} {int(month)}: --dates dmy or --dates mdy says which")

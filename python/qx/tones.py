@@ -59,10 +59,10 @@ def spectrum(values):
 
 def plot(recording, found, analysis, path):
     """The spectrum in dB of the largest tone, with the tones and the harmonics."""
-    from . import report
-    plt = report._pyplot()
+    from . import drawing, sections
+    plt = drawing.pyplot()
     figure, axes = plt.subplots(figsize=(10, 4))
-    scale, label = report.frequency_axis(recording)
+    scale, label = sections.frequency_axis(recording)
     frequencies, amplitudes = spectrum(recording.values)
     largest = found.amplitudes[0]
 
@@ -71,11 +71,11 @@ def plot(recording, found, analysis, path):
 
     lines = decibels(amplitudes)
     bottom = min(decibels(found.amplitudes).min(), np.median(lines)) - 25
-    report._trace(axes, scale * frequencies, lines, color=report.GREY, linewidth=0.6)
+    drawing.trace(axes, scale * frequencies, lines, color=drawing.GREY, linewidth=0.6)
     seen = np.nan_to_num(analysis.amplitudes) > largest * 10**(bottom / 20)
-    axes.plot(found.frequencies, decibels(found.amplitudes), "o", color=report.BLUE, markersize=5,
+    axes.plot(found.frequencies, decibels(found.amplitudes), "o", color=drawing.BLUE, markersize=5,
               label="tones")
-    axes.plot(analysis.frequencies[seen], decibels(analysis.amplitudes[seen]), "x", color=report.WARM,
+    axes.plot(analysis.frequencies[seen], decibels(analysis.amplitudes[seen]), "x", color=drawing.WARM,
               markersize=6, label="harmonics")
     for h in np.flatnonzero(seen):
         axes.annotate(str(h + 1), (analysis.frequencies[h], decibels(analysis.amplitudes[h])),

@@ -3,7 +3,6 @@
 import contextlib
 import html
 import io
-import os
 import re
 import struct
 import sys
@@ -20,7 +19,7 @@ PYTHON = Path(__file__).resolve().parent.parent
 sys.path.insert(0, str(PYTHON))
 import qx  # noqa: E402
 from qx import __main__ as command  # noqa: E402
-from qx import audio, recording, report, tables  # noqa: E402
+from qx import audio, drawing, recording, report, sections_recording, sections_spectra, tables  # noqa: E402
 
 ECG = PYTHON.parent / "examples/data/ecg_208_360hz.csv"
 
@@ -192,7 +191,7 @@ class Reading(InFolder):
                     lows, highs = read.whole.outline()
                     self.assertEqual((32768 * lows).tolist(), [*range(0, 500, 64)])
                     self.assertEqual((32768 * highs).tolist(), [*range(63, 500, 64), 499])
-                    section = report.overview(read)
+                    section = sections_recording.overview(read)
                 self.assertEqual({row.label: row.value for row in section.rows}["Samples in the file"], "500")
                 self.drawn("".join(f"<figure>{figure}</figure>" for figure in section.figures))
             self.assertIn("without the first 150 samples", self.read(text, start=150).choice)
@@ -262,8 +261,9 @@ class Report(InFolder):
     def test_labels_have_the_digits_that_tell_them_apart(self):
         wave = np.sin(np.arange(3000) / 9)
         for offset, factor in ((101325, 0.01), (-3e9, 0.1), (5e-9, 1e-12), (0, 1e160)):
-            with mock.patch.object(report, "SECTIONS", [report.histogram, report.amplitudes]), \
-                    mock.patch.object(report, "_svg", lambda plt, figure: plt.close(figure) or ""):
+            with mock.patch.object(report, "SECTIONS", [sections_recording.histogram,
+                                                        sections_spectra.amplitudes]), \
+                    mock.patch.object(drawing, "svg", lambda plt, figure: plt.close(figure) or ""):
                 lines, _ = self.made(offset + factor * wave)
             start = next(i for i, line in enumerate(lines) if "bin centre" in line)
             labels = [line.split()[0] for line in lines[start + 1:start + 13]]
@@ -295,7 +295,7 @@ class Report(InFolder):
         def refused(_):
             qx.Mean_head([])
 
-        with mock.patch.object(report, "SECTIONS", [refused, report.statistics]):
+        with mock.patch.object(report, "SECTIONS", [refused, sections_recording.statistics]):
             lines, _ = self.made([1.0, 2.0])
         self.assertTrue(any(line.startswith("Refused: Not possible for this recording") for line in lines))
         self.assertTrue(any("Root mean square" in line for line in lines))
@@ -345,7 +345,7 @@ class Spectra(unittest.TestCase):
             x = 3 + 0.5 * np.cos(2 * np.pi * 7 * np.arange(n) / n + 0.3)
             if n % 2 == 0:
                 x += 0.25 * np.cos(np.pi * np.arange(n))
-            frequencies, amplitudes = report.amplitude_spectrum(
+            frequencies, amplitudes = sections_spectra.amplitude_spectrum(
                 recording.Recording("", x, None, "", "", "", []))
             expected = np.zeros(n // 2 + 1)
             expected[[0, 7]] = 3, 0.5
@@ -356,14 +356,14 @@ class Spectra(unittest.TestCase):
 
     def test_the_strongest_parts_are_apart(self):
         values = np.array([5, 9, 8, 0, 7, 1.0])
-        found = report.strongest(np.arange(6) / 10, values, 3, 0.15)
+        found = sections_spectra.strongest(np.arange(6) / 10, values, 3, 0.15)
         self.assertEqual([int(i) for i in found], [1, 4])
-        self.assertEqual(report.strongest(np.arange(6) / 10, 0 * values, 3, 0.15), [])
+        self.assertEqual(sections_spectra.strongest(np.arange(6) / 10, 0 * values, 3, 0.15), [])
 
     def test_the_averaged_spectrum_is_a_density(self):
         x = np.random.default_rng(4).normal(size=1000)
         for length in (64, 50):
-            frequencies, density, segments = report.averaged_spectrum(x, length)
+            frequencies, density, segments = sections_spectra.averaged_spectrum(x, length)
             window = 0.5 - 0.5 * np.cos(2 * np.pi * np.arange(length) / length)
             starts = range(0, 1000 - length + 1, length // 2)
             parts = [np.abs(np.fft.rfft(window * x[i:i + length]))**2 for i in starts]

@@ -133,6 +133,7 @@ class Resample(unittest.TestCase):
 
     def test_clipping_is_told(self):
         square = np.sign(np.sin(2 * np.pi * 0.01 * (np.arange(2000) + 0.5)))
+        told = 0, 0.0
         for subtype, clipped in (("PCM_16", True), ("FLOAT", False)):
             soundfile.write(self.source, square, 8000, subtype)
             ran = self.command(self.source, self.target, "--rate", "44100", "--force")

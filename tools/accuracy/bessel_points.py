@@ -1,7 +1,7 @@
 """Where Bessel functions and their kin, elliptic integrals, Dawson, Fresnel and zeta are measured."""
 
 import mpmath
-from mpmath import mp, mpf, pi, sqrt
+from mpmath import mpf, pi, sqrt
 
 from accuracy import (Function, around, from_gsl, from_scipy, from_std, linear, logarithmic, pairs, product,
                       single)

@@ -60,6 +60,7 @@ INCOMPLETE_BETA = [("a, b in [0.1, 10]", incomplete_beta([0.1, 0.5, 1, 2, 5.5, 1
                    ("a, b in [100, 1000]", incomplete_beta([100, 333, 1000])),
                    ("a, b in [2000, 20000]", incomplete_beta([2000, 20000]))]
 
+
 def lower_gamma(a, x):
     if x > a:
         return 1 - mpmath.gammainc(a, x, regularized=True)

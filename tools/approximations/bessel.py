@@ -6,8 +6,7 @@ usage: bessel.py REPOSITORY
 
 import sys
 
-from mpmath import (mp, mpf, besselj, bessely, besseli, besselk, besseljzero, sqrt, log, pi, exp, cos, sin,
-                    taylor)
+from mpmath import mpf, besselj, bessely, besseli, besselk, besseljzero, sqrt, log, pi, exp, cos, sin
 
 from rational import Table
 

@@ -6,7 +6,7 @@ usage: elementary.py REPOSITORY [NAME...]
 
 import sys
 
-from mpmath import (cos, ellipe, ellipk, erfi, exp, fresnelc, fresnels, log, mp, mpf, pi, sin, sqrt, zeta)
+from mpmath import (cos, ellipe, ellipk, erfi, exp, fresnelc, fresnels, log, mpf, pi, sin, sqrt, zeta)
 
 from rational import Table
 

@@ -153,7 +153,7 @@ def pulse(options):
         write_table(options.csv, names, [
             (i, p.start * step, p.end * step, p.width * step, p.first_duration * step,
              p.second_duration * step, p.first_overshoot, p.second_overshoot)
-            for i, p in enumerate(found, 1)])
+            for i, p in enumerate(found or (), 1)])
 
 
 def add_common(command):

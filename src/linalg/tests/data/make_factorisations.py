@@ -107,6 +107,7 @@ def functions():
     for at in range(0, len(lines), 5):
         name = lines[at].split()[0].replace("_", " ")
         a, exp, log, root = (numbers(line) for line in lines[at + 1:at + 5])
+
         def error(x, exact):
             return f"{norm(x - exact) / norm(exact):.1e}"
         ours = qx.call("CxMatrixLn_head", a)

@@ -26,7 +26,8 @@ for n in (0, 1):
     for x in [1e-20, 0.1, 2.4048255576957729, 3.7, 7.1, 13.0, 100.5, 1e6] + list(sides(8, 20)):
         row("BesselJr", [n, x], 0, mpmath.besselj(n, mpf(x)), 9, wave(n, x))
         row("BesselYr", [n, x], 0, mpmath.bessely(n, mpf(x)), 17, max(wave(n, x), mpf("0.3")))
-for n, x in [(2, 0.5), (5, 5.5), (30, 28), (30, 33), (150, 20), (150, 149.5), (150, 152), (199, 180), (107, 0.10170048004340347), (60, 1000.5)]:
+for n, x in [(2, 0.5), (5, 5.5), (30, 28), (30, 33), (150, 20), (150, 149.5), (150, 152), (199, 180),
+             (107, 0.10170048004340347), (60, 1000.5)]:
     row("BesselJr", [n, x], 0, mpmath.besselj(n, mpf(x)), 5, wave(n, x))
     row("BesselYr", [n, x], 0, mpmath.bessely(n, mpf(x)), 9, wave(n, x))
 for n in (200, 200.5, 1234, 1234.5):  # expansions for large order and their seams

@@ -16,7 +16,8 @@ def sides(*thresholds):
 
 def row(name, arguments, output, value, tolerance, scale=0):
     """NAME ARGUMENT ... OUTPUT VALUE BOUND; the bound is absolute: so many eps of the value or,
-    where that is larger, of a scale. It stands at about four times the measured peak. What a double cannot hold is left out."""
+    where that is larger, of a scale. It stands at about four times the measured peak. What a
+    double cannot hold is left out."""
     value = mpmath.re(value)
     if value != 0 and not 1e-290 < abs(value) < 1e308:
         return

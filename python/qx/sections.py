@@ -1,0 +1,57 @@
+"""What the sections of pages are made of: rows of figures, numbers as texts, units and axes."""
+
+import dataclasses
+import math
+
+
+@dataclasses.dataclass
+class Row:
+    label: str
+    value: str
+    unit: str
+    export: str  # the export behind the number, and what else went into it
+
+
+@dataclasses.dataclass
+class Section:
+    title: str
+    text: str  # one paragraph
+    rows: list = dataclasses.field(default_factory=list)
+    figures: list = dataclasses.field(default_factory=list)  # SVG texts
+    terminal: list = dataclasses.field(default_factory=list)  # further lines for the terminal
+
+
+def number(value, digits=6):
+    return f"{value:.{digits}g}" if math.isfinite(value) else "beyond all numbers"
+
+
+def resolved(values, step):
+    """The values as texts with the digits that a difference of `step` needs."""
+    values = [float(value) for value in values]
+    largest = max((abs(value) for value in values), default=0.0)
+    if not (step > 0 and math.isfinite(step) and math.isfinite(largest)):
+        return [number(value) for value in values]
+    place = math.floor(math.log10(step)) - 1  # of the last digit, one finer than the step
+    if 1e-4 <= max(largest, step) < 1e7:
+        return [f"{value:.{max(0, -place)}f}" for value in values]
+    digits = max(1, math.floor(math.log10(largest)) - place) if largest else 1
+    return [f"{value:.{min(17, digits)}e}" for value in values]
+
+
+def power_unit(unit, exponent):
+    if not unit or exponent == 1:
+        return unit
+    return unit + {2: "²", 3: "³", 4: "⁴"}[exponent]
+
+
+def quantity(recording):
+    """The label of an axis of values."""
+    name = recording.channel[:1].upper() + recording.channel[1:]
+    return f"{name} ({recording.unit})" if recording.unit else name
+
+
+def frequency_axis(recording):
+    """The factor from cycles per sample and the label of an axis of frequencies."""
+    if recording.rate:
+        return recording.rate, "Frequency (Hz)"
+    return 1.0, "Frequency (cycles per sample)"
