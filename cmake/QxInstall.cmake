@@ -22,6 +22,7 @@ function(qx_install)
     install(FILES ${PROJECT_BINARY_DIR}/qxanalysisConfigVersion.cmake DESTINATION ${package})
     install(DIRECTORY ${PROJECT_SOURCE_DIR}/include/qx ${PROJECT_BINARY_DIR}/include/qx
         DESTINATION ${CMAKE_INSTALL_INCLUDEDIR})
+    install(DIRECTORY ${QX_LICENCES} DESTINATION ${CMAKE_INSTALL_DOCDIR})
     install(FILES ${QX_CATALOGUE} DESTINATION ${CMAKE_INSTALL_DATADIR}/qxanalysis)
     if(NOT WIN32)
         set(QX_RUN_PATH "-Wl,-rpath,\${libdir} ")

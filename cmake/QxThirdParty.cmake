@@ -31,3 +31,21 @@ set_target_properties(qxlapack PROPERTIES INTERFACE_INCLUDE_DIRECTORIES ${QX_FOL
 # The core has what compiled Fortran asks for.
 target_link_libraries(qxlapack INTERFACE qxopenblas qxcore)
 target_link_libraries(qxopenblas INTERFACE qxlibm)
+
+# Their licences, which are installed with the module (NOTICE.md): the name says of what.
+set(QX_LICENCES ${PROJECT_BINARY_DIR}/licences)
+file(REMOVE_RECURSE ${QX_LICENCES})
+foreach(pair IN ITEMS libm:musl lapack:lapack openblas:openblas)
+    string(REGEX MATCH "(.*):(.*)" pair ${pair})
+    file(GLOB texts ${QX_FOLDER_${CMAKE_MATCH_1}}/licences/*)
+    foreach(text IN LISTS texts)
+        cmake_path(GET text FILENAME name)
+        configure_file(${text} ${QX_LICENCES}/${CMAKE_MATCH_2}-${name} COPYONLY)
+    endforeach()
+endforeach()
+configure_file(${PROJECT_SOURCE_DIR}/NOTICE.md ${QX_LICENCES}/NOTICE.md COPYONLY)
+if(WIN32)
+    configure_file(/usr/share/doc/gcc-mingw-w64-base/copyright ${QX_LICENCES}/windows-gcc-copyright COPYONLY)
+    configure_file(/usr/share/doc/mingw-w64-i686-dev/copyright
+        ${QX_LICENCES}/windows-mingw-w64-copyright COPYONLY)
+endif()

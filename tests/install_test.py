@@ -68,6 +68,27 @@ class Installed(Using):
         catalogue = json.loads((self.prefix / "share/qxanalysis/catalogue.json").read_text("utf-8"))
         self.assertEqual(version, catalogue["version"])
 
+    def test_programs_ask_for_the_module_by_the_first_number_of_its_version(self):
+        library = next(self.prefix.rglob("libqxanalysis.so"))
+        catalogue = json.loads((self.prefix / "share/qxanalysis/catalogue.json").read_text("utf-8"))
+        first = f"libqxanalysis.so.{catalogue['version'].split('.')[0]}"
+        self.assertRegex(run("readelf", "-d", library), rf"SONAME.*\[{re.escape(first)}\]")
+        self.assertEqual(library.resolve().name, f"libqxanalysis.so.{catalogue['version']}")
+        self.assertEqual((library.parent / first).resolve(), library.resolve())
+        # The name by which the module looks for its host has no version.
+        self.assertRegex(run("readelf", "-d", library.parent / "libqxrt.so"), r"SONAME.*\[libqxrt\.so\]")
+
+    def test_notices_of_what_the_module_carries(self):
+        licences = self.prefix / "share/doc/qxanalysis/licences"
+        notice = (licences / "NOTICE.md").read_text("utf-8")
+        lock = (SOURCE / "tools/setup/sources.lock").read_text("utf-8")
+        carried = set(re.findall(r"^([a-z]\S*) (\S+) [0-9a-f]{64} ", lock, re.MULTILINE))
+        self.assertEqual(set(re.findall(r"^\| (\w+) \| ([\w.+-]*\d[\w.+-]*) \|", notice.lower(), re.MULTILINE)), carried)
+        named = re.findall(r"`((?:musl|lapack|openblas)-[^`]+)`", notice)
+        self.assertEqual(sorted(named), sorted(path.name for path in licences.iterdir() if path.name != "NOTICE.md"))
+        for name in named:
+            self.assertRegex((licences / name).read_text("utf-8"), "(?i)copyright")
+
     def test_headers_stand_alone_and_are_all_there(self):
         names = sorted(path.name for path in (self.prefix / "include/qx").iterdir())
         expected = {path.name for path in (SOURCE / "include/qx").iterdir()} | {"qx.h"}

@@ -38,7 +38,10 @@ class Package(unittest.TestCase):
             package = ROOT / "python/qx"
             expected = {f"qx/{path.relative_to(package)}" for path in package.rglob("*.py")}
             expected |= {f"qx/{file}" for file in ("libqxanalysis.so", "libqxrt.so", "catalogue.json",
-                                                   "__init__.pyi", "exports.pyi", "py.typed")}
+                                                   "__init__.pyi", "exports.pyi", "py.typed",
+                                                   "licences/NOTICE.md",
+                                                   "licences/musl-COPYRIGHT", "licences/lapack-LICENSE",
+                                                   "licences/openblas-LICENSE")}
             self.assertEqual(expected - inside, set())
             venv.create(folder / "venv", system_site_packages=True)
             python = folder / "venv/bin/python3"

@@ -46,8 +46,8 @@ class InFolder(unittest.TestCase):
         for figure in figures:
             drawings = re.findall(r'<svg class="(\w+)".*?</svg>', figure, re.DOTALL)
             self.assertEqual(drawings, ["wide", "narrow"])
-            for drawing in re.findall(r"<svg.*?</svg>", figure, re.DOTALL):
-                root = xml.etree.ElementTree.fromstring(drawing)
+            for one in re.findall(r"<svg.*?</svg>", figure, re.DOTALL):
+                root = xml.etree.ElementTree.fromstring(one)
                 shown += ["".join(part.itertext()) for part in root.iter("{http://www.w3.org/2000/svg}text")]
         return shown
 
