@@ -1,63 +1,128 @@
 #!/usr/bin/python3
-"""speed_page.py LOG...: the page docs/speed.md from what the benchmarks have printed."""
+"""speed_page.py FOLDER PAGE: writes the page of speeds, and its figures beside it (PAGE with .json), from the
+runs that bench/record.py has written into FOLDER.
 
-import datetime
-import os
-import platform
-import subprocess
+Of each family and width the two latest runs on one machine with one compiler and one state of the sources
+count. A row is their geometric mean; it is marked where they differ by more than 3 %, where there is but
+one, and where the mean has moved by more than 5 % since the page before on the same machine. A family that
+has not been run keeps the figures of the page before.
+"""
+
+import itertools
+import json
+import math
 import sys
 from pathlib import Path
 
+AGREE, MOVED = 0.03, 0.05
 HEAD = """# Speed
 
-Written by `bench/run --all`. Each row is a geometric mean of the ratios time of ours / time of the
-peer, one thread, plans and the like made outside the timed loop; below 1 is faster than the peer.
-The shortest of interleaved runs; on a machine with a load of its own (below) single worst cases say
-little, and FFTW_MEASURE, which plans by timing and for ten seconds at most, chooses badly for the
-longest transforms.
+Written by `bench/run --all`, and not by hand. Each row is a geometric mean of the ratios time of ours / time of
+the peer, one thread, plans and the like made outside the timed loop; below 1 is faster than the peer. Times are
+the shortest of interleaved runs; on a machine with a load of its own (below) single worst cases say little, and
+FFTW_MEASURE, which plans by timing and for ten seconds at most, chooses badly for the longest transforms.
+
+"Runs": empty where two runs of the benchmark agree within 3 %, else by how much they differ, or that there was
+one run alone; Mean is the geometric mean of the two, Worst the greater. "Before": the mean on the page before
+this one, where it has moved by more than 5 % on the same machine and width.
 """
+SAME = ("machine", "width", "compiler", "commit")
 
 
-def machine():
-    """What the figures were measured on."""
-    facts = dict(line.split(":", 1) for line in
-                 subprocess.run(["lscpu"], capture_output=True, text=True,
-                                check=True).stdout.splitlines() if ":" in line)
-    caches = ", ".join(f"{name} {facts[name + ' cache'].strip()}" for name in ("L1d", "L2", "L3")
-                       if name + " cache" in facts)
-    return (f"{facts['Model name'].strip()} (family {facts['CPU family'].strip()}, model "
-            f"{facts['Model'].strip()}), {os.cpu_count()} processors, {caches}; "
-            f"{platform.system()} {platform.release()}, {datetime.date.today().isoformat()}, load "
-            f"average {os.getloadavg()[2]:.1f}")
+def latest(folder):
+    """The runs that count: {(family, width): [the latest, and the one before it if it is of the same kind]}."""
+    runs = {}
+    for path in sorted(Path(folder).glob("*.json")):
+        run = json.loads(path.read_text("utf-8"))
+        runs.setdefault((run["family"], run["width"]), []).append(run)
+    chosen = {}
+    for key, all_ in runs.items():
+        newest = sorted(all_, key=lambda run: run["time"])[::-1]
+        chosen[key] = [run for run in newest[:2] if all(run[name] == newest[0][name] for name in SAME)]
+    return chosen
 
 
-def main():
-    family, rows, builds, absent, stopped = None, [], set(), [], []
-    for line in (line for log in sys.argv[1:] for line in Path(log).read_text().splitlines()):
-        if line.startswith("== "):
-            family = line[3:]
-        elif line.startswith("missing peer: "):
-            absent.append(f"- `{family}`: {line.removeprefix('missing peer: ')}")
-        elif line.startswith("stopped: "):
-            stopped.append(f"- `{family}`, {line.removeprefix('stopped: ')}")
-        elif line.startswith("summary | "):
-            what, peer, mean, worst, case, count, width, compiler = [
-                cell.strip() for cell in line.split(" |")[1:]]
-            builds.add((width, compiler))
-            rows.append(f"| {family} | {what} | {peer} | {mean} | {worst} | {case} | {count} |")
-    print(HEAD)
-    print(f"Machine: {machine()}.\n")
-    for width, compiler in sorted(builds):
-        print(f"Width {width}, {compiler}.\n")
-    print("| Family | What | Peer | Mean | Worst | At | Cases |\n|---|---|---|---|---|---|---|")
-    print("\n".join(rows))
-    if stopped:
-        print("\nStopped before their end, so that groups of cases are missing:\n")
-        print("\n".join(stopped))
-    if absent:
-        print("\nPeers that were not installed:\n")
-        print("\n".join(absent))
+def merged(runs):
+    """One family's figures from its runs."""
+    first = runs[0]
+    rows = {}
+    for row in itertools.chain(*(run["rows"] for run in reversed(runs))):
+        rows.setdefault((row["what"], row["peer"]), []).append(row)
+    figures = []
+    for (what, peer), found in rows.items():
+        means = [row["mean"] for row in found]
+        worst = max(found, key=lambda row: row["worst"])
+        figures.append({"what": what, "peer": peer, "mean": math.prod(means)**(1 / len(means)),
+                        "apart": max(means) / min(means) - 1 if len(means) > 1 else None,
+                        "worst": worst["worst"], "case": worst["case"], "count": worst["count"]})
+    return {**{name: first[name] for name in ("family", "time", *SAME, "missing", "stopped")},
+            "load": max(run["load"] for run in runs),
+            "rows": figures}
+
+
+def compared(now, before):
+    """The figures with the mean of the page before in each row that has moved."""
+    old = {}
+    if before and before["machine"] == now["machine"]:
+        old = {(row["what"], row["peer"]): row["mean"] for row in before["rows"]}
+    rows = []
+    for row in now["rows"]:
+        was = old.get((row["what"], row["peer"]))
+        moved = was is not None and max(row["mean"] / was, was / row["mean"]) > 1 + MOVED
+        rows.append({**row, "before": was if moved else None})
+    return {**now, "rows": rows}
+
+
+def number(value):
+    return f"{value:.2f}" if value >= 0.095 else f"{value:.2g}"
+
+
+def line(family, row):
+    apart = "one run" if row["apart"] is None else "" if row["apart"] <= AGREE else f"{100 * row['apart']:.0f} % apart"
+    before = number(row["before"]) if row["before"] else ""
+    return (f"| {family} | {row['what']} | {row['peer']} | {number(row['mean'])} | {apart} | {before} | "
+            f"{number(row['worst'])} | {row['case']} | {row['count']} |")
+
+
+def page(figures):
+    lines = [HEAD]
+    build = {name: lambda one, name=name: one[name] for name in ("machine", "width", "compiler")}
+    for key, families in itertools.groupby(
+            sorted(figures, key=lambda one: (*(get(one) for get in build.values()), one["family"])),
+            key=lambda one: tuple(get(one) for get in build.values())):
+        families = list(families)
+        machine, width, compiler = key
+        dates = sorted({one["time"][:10] for one in families})
+        when = f"on {dates[0]}" if len(dates) == 1 else f"from {dates[0]} to {dates[-1]}"
+        lines += [f"## Width {width}, {compiler}\n", f"Machine: {machine}.\n",
+                  f"Measured {when}, load average up to {max(one['load'] or 0 for one in families):.1f}.\n",
+                  "| Family | What | Peer | Mean | Runs | Before | Worst | At | Cases |\n"
+                  "|---|---|---|---|---|---|---|---|---|"]
+        lines += [line(one["family"], row) for one in families for row in one["rows"]]
+        stopped = [f"- `{one['family']}`, {one['stopped']}" for one in families if one["stopped"]]
+        missing = [f"- `{one['family']}`: {peer}" for one in families for peer in one["missing"]]
+        if stopped:
+            lines += ["\nStopped before their end, so that groups of cases are missing:\n", *stopped]
+        if missing:
+            lines += ["\nPeers that were not installed:\n", *missing]
+        lines.append("")
+    return "\n".join(lines)
+
+
+def main(folder, target):
+    target = Path(target)
+    kept = target.with_suffix(".json")
+    before = {(one["family"], one["width"]): one
+              for one in (json.loads(kept.read_text("utf-8")) if kept.exists() else [])}
+    now = {key: compared(merged(runs), before.get(key)) for key, runs in latest(folder).items()}
+    # Written again without a new run, the page compares with what it compared with before.
+    for key, one in now.items():
+        if key in before and before[key]["time"] == one["time"]:
+            now[key] = before[key]
+    figures = [now.get(key, before.get(key)) for key in sorted(before.keys() | now.keys())]
+    kept.write_text(json.dumps(figures, indent=1, ensure_ascii=False) + "\n", "utf-8")
+    target.write_text(page(figures), "utf-8")
 
 
 if __name__ == "__main__":
-    main()
+    main(*sys.argv[1:])

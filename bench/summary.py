@@ -24,5 +24,5 @@ def print_summary(what, peer, ratios):
     """`ratios`: pairs of ours/peer and the name of the case."""
     mean = math.exp(sum(math.log(ratio) for ratio, _ in ratios) / len(ratios))
     worst, case = max(ratios)
-    print(f"summary | {what} | {peer} | {mean:.2f} | {worst:.2f} | {case} | {len(ratios)} | "
+    print(f"summary | {what} | {peer} | {mean:.4g} | {worst:.4g} | {case} | {len(ratios)} | "
           f"{width()} | {compiler()}")

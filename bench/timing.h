@@ -27,7 +27,7 @@
 //     over.summary("FFTW, estimate");    // the family's closing line, against whom
 //
 // A program prints one summary for each peer (or kind of task), at its end. bench/run --all
-// collects them in docs/speed.md. A peer that is not installed is told by the summary of empty
+// collects them in docs/speed.md, whose rows are named by the group and the peer. A peer that is not installed is told by the summary of empty
 // Ratios, so call it in any case; bench/run names the package. A cell without a peer is printed by
 // Cell.
 
@@ -116,7 +116,7 @@ public:
     void summary(const std::string &peer) const {
         std::printf("summary | %s | %s | ", name_.c_str(), peer.c_str());
         if (count_ > 0)
-            std::printf("%.2f | %.2f | %s | %d", mean(), worst_, worstCase_.c_str(), count_);
+            std::printf("%.4g | %.4g | %s | %d", mean(), worst_, worstCase_.c_str(), count_);
         else
             std::printf("missing | | | 0");
         std::printf(" | %s | %s\n", WidthInUse(), compiler);
