@@ -73,7 +73,10 @@ class OrderOfFortran(Case):
                                          " use b_middle\nend module\n"})
 
     def test_the_order_of_lapack_can_be_compiled(self):
-        shown, _ = self.same(lambda seed, _: output(seed, SOURCE / "tools/setup/lapack", "order"), SEEDS[:4])
+        folder = tempfile.TemporaryDirectory()
+        self.addCleanup(folder.cleanup)
+        shown, _ = self.same(lambda seed, _: output(seed, SOURCE / "tools/setup/lapack", "order", folder.name),
+                             SEEDS[:4])
         compiled, stages, users = set(), {}, 0
         for stage, path in (line.split(" ", 1) for line in shown.splitlines()):
             stages.setdefault(int(stage), []).append(Path(path).read_text("utf-8", errors="replace"))
