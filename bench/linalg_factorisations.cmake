@@ -1,1 +1,2 @@
 qx_bench(linalg_factorisations SOURCES linalg_factorisations.cpp)
+target_include_directories(bench_linalg_factorisations PRIVATE ${QX_LAPACK_HEADERS})

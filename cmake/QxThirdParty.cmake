@@ -26,8 +26,9 @@ foreach(library IN ITEMS libm lapack openblas)
     set_target_properties(qx${library} PROPERTIES IMPORTED_LOCATION ${archive})
     set(QX_FOLDER_${library} ${folder})
 endforeach()
-# Only src/linalg/lapack.cpp includes the headers of LAPACK and BLAS.
-set_target_properties(qxlapack PROPERTIES INTERFACE_INCLUDE_DIRECTORIES ${QX_FOLDER_lapack}/include)
+# Of LAPACK and BLAS. One source and two benchmarks include them: no other compilation depends on where
+# they are.
+set(QX_LAPACK_HEADERS ${QX_FOLDER_lapack}/include)
 # The core has what compiled Fortran asks for.
 target_link_libraries(qxlapack INTERFACE qxopenblas qxcore)
 target_link_libraries(qxopenblas INTERFACE qxlibm)
