@@ -54,7 +54,7 @@ def ours(cells, random_factors=(), significance=0.05):
     y, labels = columns(cells)
     signed = [-(max(l) + 1) if i in random_factors else max(l) + 1 for i, l in enumerate(labels)]
     name = "Anova2Way_head_2017" if len(labels) == 2 else "ANOVA3Way_head_2017"
-    return qx.call(name, y, *(np.array(l, np.int32) for l in labels), *signed,
+    return qx.call(name, y, *(np.array(one, np.int32) for one in labels), *signed,
                    len(next(iter(cells.values()))), significance)
 
 
