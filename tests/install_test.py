@@ -118,7 +118,8 @@ class Readme(Using):
     TEXT = (SOURCE / "README.md").read_text("utf-8")
 
     def block(self, language):
-        return re.search(rf"```{language}\n(.*?)```", self.TEXT, re.DOTALL)[1]
+        """The blocks of a language, which go on where the one before has ended."""
+        return "".join(re.findall(rf"```{language}\n(.*?)```", self.TEXT, re.DOTALL))
 
     def compiled(self, start):
         """Runs the compile line that begins so, with this build; gives the program's output."""
@@ -136,7 +137,7 @@ class Readme(Using):
     def test_python(self):
         ran = subprocess.run(["/usr/bin/python3", "-c", self.block("python")], capture_output=True, text=True,
                              env={"PYTHONPATH": str(SOURCE / "python"), "QX_LIBRARY_DIR": str(BUILD)})
-        self.assertRegex(ran.stderr.strip().split("\n")[-1], "QxError: Mean_head.*ErrEmptyInput")
+        self.assertRegex(ran.stderr.strip().split("\n")[-1], "Error: Mean_head.*ErrEmptyInput")
         self.assertIn("Gives moment.", ran.stdout)
 
     def test_packages_are_those_that_are_installed(self):

@@ -4,7 +4,7 @@
 #                             source; ends the script where the library is already there, and with
 #                             status 1 where it is not and is only looked for
 #   finish_library LICENCE...  moves what has been built to its place and prints the archive's path
-#   need_tools "PACKAGE..." COMMAND...   need_commands, but where the library is only looked for
+#   need_tools "PACKAGE..." COMMAND...   need_commands; nothing where the library is only looked for
 #   unpack_source PACKAGE FOLDER   the pinned source with our patches
 #
 # A library lies in a folder of the cache with its licences. The folder's name holds a hash of all that
