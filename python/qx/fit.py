@@ -371,6 +371,7 @@ def line(x, y, sigma=None, bounds=None, method="least squares"):
       dof       2
     """
     x, y, w = _samples("line", x, y, sigma)
+
     def run(y, x, w, start, lower, upper, code):
         if code == 0:
             return core.line(y, x, w, lower, upper)[1:3]

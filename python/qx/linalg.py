@@ -1418,7 +1418,6 @@ def balance(a):
     return balanced, _served("balance_back", a)(3, 0, low, high, scale, np.eye(len(a)))
 
 
-
 @result
 class GSVD(Result):
     """A generalised singular value decomposition of a and b.

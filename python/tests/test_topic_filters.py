@@ -24,6 +24,7 @@ SHORT = {"lowpass": 40, "highpass": 40, "bandpass": (40, 90), "bandstop": (40, 9
 def close(found, expected, rtol=1e-9, atol=1e-12):
     np.testing.assert_allclose(found, expected, rtol=rtol, atol=atol)
 
+
 # The same cases in each run, and no folder of earlier ones.
 hypothesis.settings.register_profile("same", derandomize=True, database=None)
 hypothesis.settings.load_profile("same")

@@ -31,6 +31,7 @@ def some(*shape, is_complex=False):
     a = RNG.normal(size=shape)
     return a + 1j * RNG.normal(size=shape) if is_complex else a
 
+
 # The same cases in each run, and no folder of earlier ones.
 hypothesis.settings.register_profile("same", derandomize=True, database=None)
 hypothesis.settings.load_profile("same")

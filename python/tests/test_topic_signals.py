@@ -21,6 +21,7 @@ RNG = np.random.default_rng(7)
 def close(found, expected, rtol=1e-9, atol=1e-12):
     np.testing.assert_allclose(found, expected, rtol=rtol, atol=atol)
 
+
 # The same cases in each run, and no folder of earlier ones.
 hypothesis.settings.register_profile("same", derandomize=True, database=None)
 hypothesis.settings.load_profile("same")

@@ -72,8 +72,10 @@ NEWEST = {
         "shift_frequency": "ReComplexModulatorH", "shift_frequency_complex": "CxComplexModulatorH",
     },
     "linalg": {
-        "balance_back": "EigenVBack_head", "balance_back_complex": "CxEigenVBack_head", "gsvd": "GSVD_head", "gsvd_complex": "CxGSVD_head",
-        "is_symmetric": "CheckSym_head", "is_symmetric_complex": "CxCheckSym_head", "balance": "MatrixBalance_head", "balance_complex": "CxMatrixBalance_head",
+        "balance_back": "EigenVBack_head", "balance_back_complex": "CxEigenVBack_head", "gsvd": "GSVD_head",
+        "gsvd_complex": "CxGSVD_head",
+        "is_symmetric": "CheckSym_head", "is_symmetric_complex": "CxCheckSym_head", "balance": "MatrixBalance_head",
+        "balance_complex": "CxMatrixBalance_head",
         "lu": "LU_head", "lu_complex": "CxLU_head", "solve": "LULinEqs_head", "solve_complex":
         "CxLULinEqs_head", "solve_inverse": "LUInvMatrix_head", "solve_inverse_complex":
         "CxLUInvMatrix_head", "solve_triangular": "TriEqsSetDri_head", "solve_triangular_complex":
