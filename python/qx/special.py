@@ -671,7 +671,7 @@ def jv(v, z, scaled=False):
     --------
     >>> import qx
     >>> qx.special.jv(0.0, [0.0, 1.0]), qx.special.jv(0.5, 1j)
-    (array([1.        , 0.76519769]), (0.6630362720267227+0.6630362720267226j))
+    (array([1.        , 0.76519769]), (0.6630362720267223+0.6630362720267224j))
     """
     if not scaled and not np.iscomplexobj(z):
         return core.jv(v, z)
@@ -796,7 +796,7 @@ def kv(v, z, scaled=False):
     --------
     >>> import qx
     >>> qx.special.kv(0.5, 2.0)
-    0.11993777196806145
+    0.11993777196806146
     """
     found = core.kv(v, z, int(scaled))
     return found if np.iscomplexobj(z) or np.any(np.asarray(z) < 0) else np.asarray(found).real[()]
@@ -827,7 +827,7 @@ def hankel1(v, z, scaled=False):
     --------
     >>> import qx
     >>> qx.special.hankel1(0.0, 1.0)
-    (0.7651976865579664+0.088256964215677j)
+    (0.7651976865579667+0.08825696421567697j)
     """
     return core.hankel1(v, z, int(scaled))
 
@@ -857,7 +857,7 @@ def hankel2(v, z, scaled=False):
     --------
     >>> import qx
     >>> qx.special.hankel2(0.0, 1.0)
-    (0.7651976865579664-0.088256964215677j)
+    (0.7651976865579667-0.08825696421567697j)
     """
     return core.hankel2(v, z, int(scaled))
 

@@ -21,7 +21,7 @@ struct RecipeSpoiling {
     Disturbance disturbance;
     int32_t claimed = 0; // what the block says of that size, or of both, where it is negative
     bool claimsBoth = false;
-    std::optional<std::pair<Call::Pair, Call::Meeting>> shared;
+    std::optional<std::pair<Call::Pair, Call::Meeting>> shared = {};
 };
 RecipeSpoiling SomeSpoiling(Random &random, const Recipe &recipe);
 // How a call is made: the second time with what no result may depend on (Manner).

@@ -110,8 +110,9 @@ TEST(UniformNumbers, SeedsMakeStreamsThatDependOnEachOther) {
     for (std::size_t i = 0; i < few.size(); ++i) {
         const double multiple = (few[i] + 0.5) * 30269;
         ASSERT_NEAR(multiple, std::round(multiple), 1e-10);
-        if (i >= 30268)
+        if (i >= 30268) {
             ASSERT_EQ(few[i], few[i - 30268]);
+        }
     }
     for (const int32_t seed : {7, 8191, 1000003}) {
         const Samples once = numbers(seed), twice = numbers(2 * seed);
