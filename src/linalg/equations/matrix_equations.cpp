@@ -85,7 +85,8 @@ template <class T>
 void AdjointInPlace(Part<T> a, int32_t n) {
     for (int32_t i = 0; i < n; ++i)
         for (int32_t j = 0; j <= i; ++j) {
-            T *const below = a.data + i * a.stride + j, *const above = a.data + j * a.stride + i;
+            typename Part<T>::Element *const below = a.data + i * a.stride + j;
+            typename Part<T>::Element *const above = a.data + j * a.stride + i;
             const auto held = Conj(*below);
             *below = Conj(*above);
             *above = held;

@@ -33,7 +33,8 @@ private:
 // A part of a panel, or of any other matrix.
 template <class T>
 struct Part {
-    T *data;
+    typedef T Element __attribute__((aligned(1))); // as a template argument, T has lost it
+    Element *data;
     std::ptrdiff_t stride;
 };
 template <ElementType E>
