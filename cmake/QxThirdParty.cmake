@@ -10,7 +10,7 @@ else()
 endif()
 # What is looked for depends on all of these.
 file(GLOB recipes CONFIGURE_DEPENDS ${PROJECT_SOURCE_DIR}/tools/setup/*
-    ${PROJECT_SOURCE_DIR}/tools/setup/patches/*/*.patch ${PROJECT_SOURCE_DIR}/src/mathlib/*.[ch])
+    ${PROJECT_SOURCE_DIR}/tools/setup/patches/*/*.patch ${PROJECT_SOURCE_DIR}/src/mathlib/*.c ${PROJECT_SOURCE_DIR}/src/mathlib/pair.h)
 list(FILTER recipes EXCLUDE REGEX "/patches$")
 set_property(DIRECTORY APPEND PROPERTY CMAKE_CONFIGURE_DEPENDS ${recipes})
 
