@@ -116,7 +116,8 @@ TEST(Scratch, PartsAreTakenTogetherOrNotAtAll) {
         qx::Fill(x.data(), 3, 2.0);
         for (int64_t i = 0; i < z.count(); ++i)
             z.elements()[i] = CDB{3.0, 3.0};
-        std::fill_n(indices, 7, 4);
+        for (int i = 0; i < 7; ++i)
+            indices[i] = 4;
         EXPECT_EQ(std::count(flags, flags + 5, uint8_t{1}), 5);
         EXPECT_EQ(x[0] + x[1] + x[2], 6.0);
         EXPECT_EQ(z(rows - 1, 199).im + z(0, 0).re, 6.0);

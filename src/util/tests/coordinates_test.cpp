@@ -25,10 +25,20 @@ constexpr double eps = std::numeric_limits<double>::epsilon();
 constexpr std::array<const char *, 12> sequences = {"XYX", "XYZ", "XZX", "XZY", "YXY", "YXZ",
                                                     "YZX", "YZY", "ZXY", "ZXZ", "ZYX", "ZYZ"};
 
+// An angle up to 1e6 less its whole turns, with 2 pi in four parts whose products by the turns are
+// exact: the long double sine of some systems reduces by a pi of 66 bits only.
+long double WithoutTurns(double angle) {
+    const long double turns = std::round(angle / (2 * pi));
+    long double rest = angle - turns * 0x1.921fb544p2L;
+    rest -= turns * 0x0.42d18469p-30L;
+    rest -= turns * 0x0.898cc517p-62L;
+    return rest - turns * 0x0.01b839a2p-94L;
+}
+
 // The turn of the system about one axis, as the header draws it.
 Exact TurnAbout(char axis, double angle) {
-    const long double c = std::cos(static_cast<long double>(angle));
-    const long double s = std::sin(static_cast<long double>(angle));
+    const long double c = std::cos(WithoutTurns(angle));
+    const long double s = std::sin(WithoutTurns(angle));
     if (axis == 'X')
         return {{{1, 0, 0}, {0, c, s}, {0, -s, c}}};
     if (axis == 'Y')
