@@ -56,14 +56,17 @@ void DirectAgainstTheMachine() {
         const HostMemory x(n), y(static_cast<std::size_t>(taps)),
             out(static_cast<std::size_t>(n + taps));
         const int64_t products = int64_t{n} * taps;
-        const auto times =
-            LeastTimes([&] { qx::ConvolveReal(x.data(), n, y.data(), taps, 0, out.data()); },
-                       [&] {
-                           if (qx::lanesInUse == 4)
-                               MultiplyAndAddWide(products);
-                           else
-                               MultiplyAndAdd<16>(products);
-                       });
+        const auto times = LeastTimes(
+            [&] {
+                qx::ConvolveReal({x.data(), n}, {y.data(), taps}, qx::ConvolveDirectly,
+                                 {out.data(), n + taps - 1});
+            },
+            [&] {
+                if (qx::lanesInUse == 4)
+                    MultiplyAndAddWide(products);
+                else
+                    MultiplyAndAdd<16>(products);
+            });
         std::printf("direct convolution, %5d taps %8.2f ns an output, %5.2f of the machine's "
                     "products\n",
                     taps, times[0] / (n + taps) * 1e9, times[1] / times[0]);
@@ -80,13 +83,16 @@ void TransformsAgainstTheirTransforms() {
         const int32_t L = qx::NextTransformLength(2 * n - 1);
         const HostMemory a(static_cast<std::size_t>(L)), b(static_cast<std::size_t>(L));
         const qx::PlanReference plan(L);
-        const auto times =
-            LeastTimes([&] { qx::ConvolveReal(x.data(), n, y.data(), n, 1, out.data()); },
-                       [&] {
-                           qx::FFTRealForward(plan.get(), a.data(), b.data(), 1, 1, L);
-                           qx::FFTRealForward(plan.get(), a.data(), b.data(), 1, 1, L);
-                           qx::FFTRealInverse(plan.get(), b.data(), a.data(), 1, 1, L);
-                       });
+        const auto times = LeastTimes(
+            [&] {
+                qx::ConvolveReal({x.data(), n}, {y.data(), n}, qx::ConvolveByTransform,
+                                 {out.data(), 2 * n - 1});
+            },
+            [&] {
+                qx::FFTRealForward(plan.get(), a.data(), b.data(), 1, 1, L);
+                qx::FFTRealForward(plan.get(), a.data(), b.data(), 1, 1, L);
+                qx::FFTRealInverse(plan.get(), b.data(), a.data(), 1, 1, L);
+            });
         std::printf("convolution by transforms, n %8d %10.3f us  over its transforms %5.2f\n", n,
                     times[0] * 1e6, times[0] / times[1]);
         ratios.add(times[0] / times[1], "n " + std::to_string(n));
@@ -102,7 +108,8 @@ void FIRAgainstLiquid(Ratios &ratios) {
             state(static_cast<std::size_t>(taps));
         const auto ours = [&] {
             qx::DirectForm<qx::ElementType::DBL, qx::ElementType::DBL>::fir(
-                b.data(), taps, x.data(), samples, state.data(), y.data());
+                {b.data(), taps}, {x.data(), samples}, {state.data(), taps - 1},
+                {y.data(), samples});
         };
 #ifdef QX_PEER_LIQUID
         std::vector<float> h(b.data(), b.data() + taps), in(x.data(), x.data() + samples), out(in);
@@ -131,8 +138,9 @@ struct Sections {
         }
     }
     qx::CascadeCoefficients filter() const {
-        return {a.data(), static_cast<int32_t>(a.size()), b.data(), static_cast<int32_t>(b.size()),
-                0};
+        return {{a.data(), static_cast<std::ptrdiff_t>(a.size())},
+                {b.data(), static_cast<std::ptrdiff_t>(b.size())},
+                qx::SecondOrderSections};
     }
 };
 
@@ -142,7 +150,8 @@ void CascadeAgainstLiquid(Ratios &ratios) {
         const HostMemory signal(samples), x(samples), state(2 * static_cast<std::size_t>(sections));
         const auto ours = [&] {
             std::memcpy(x.data(), signal.data(), sizeof(double) * samples);
-            qx::FilterIIRCascade(s.filter(), state.data(), 2 * sections, x.data(), samples);
+            qx::FilterIIRCascade<qx::ElementType::DBL>(s.filter(), {state.data(), 2 * sections},
+                                                       {x.data(), samples});
         };
 #ifdef QX_PEER_LIQUID
         std::vector<float> numerators(s.b.begin(), s.b.end()), denominators;

@@ -38,20 +38,22 @@ ErrorCode ScaledPolynomial(int32_t n, DBL *c, double &g) {
 // greatest real root.
 ErrorCode BesselCutoffScale(const DBL *c, int32_t n, double &scale) {
     const int32_t count = 2 * n + 1;
-    Scratch<ElementType::DBL> even, odd, evenSquare, oddSquare;
-    Scratch<ElementType::CDB> polynomial;
-    if (even.allocate(n + 1) != 0 || odd.allocate(n + 1) != 0 || evenSquare.allocate(count) != 0 ||
-        oddSquare.allocate(count) != 0 || polynomial.allocate(count) != 0)
-        return ErrOutOfMemory;
+    RealVector even, odd, evenSquare, oddSquare;
+    ComplexVector polynomial;
+    ScratchParts memory;
+    if (const ErrorCode failed =
+            memory.take(Sized(even, n + 1), Sized(odd, n + 1), Sized(evenSquare, count),
+                        Sized(oddSquare, count), Sized(polynomial, count)))
+        return failed;
     for (int32_t i = 0; i <= n; ++i) {
         const double part = i / 2 % 2 == 0 ? c[i] : -c[i];
         even[i] = i % 2 == 0 ? part : 0.0;
         odd[i] = i % 2 == 0 ? 0.0 : part;
     }
-    if (ConvolveReal(even.data(), n + 1, even.data(), n + 1, ConvolveDirectly, evenSquare.data()) !=
-            0 ||
-        ConvolveReal(odd.data(), n + 1, odd.data(), n + 1, ConvolveDirectly, oddSquare.data()) != 0)
-        return ErrOutOfMemory;
+    if (const ErrorCode failed = ConvolveReal(even, even, ConvolveDirectly, evenSquare))
+        return failed;
+    if (const ErrorCode failed = ConvolveReal(odd, odd, ConvolveDirectly, oddSquare))
+        return failed;
     for (int32_t i = 0; i < count; ++i)
         polynomial[count - 1 - i] = {evenSquare[i] + oddSquare[i] - (i == 0 ? 2.0 : 0.0), 0.0};
     int32_t roots = 0;
@@ -114,7 +116,7 @@ void AddRealPoles(const CDB *poles, int32_t n, double scale, DigitalSections &se
 }
 
 void AddPolePairs(const CDB *poles, int32_t n, double scale, DigitalSections &sections) {
-    bool isSecond = false; // conjugates stand next to each other
+    bool isSecond = false; // conjugates are next to each other
     for (int32_t i = 0; i < n; ++i) {
         if (IsReal(poles[i]))
             continue;
@@ -128,10 +130,11 @@ void AddPolePairs(const CDB *poles, int32_t n, double scale, DigitalSections &se
 } // namespace
 
 ErrorCode BesselPrototype(int32_t n, DigitalSections &sections) {
-    Scratch<ElementType::DBL> c;
-    Scratch<ElementType::CDB> poles;
-    if (c.allocate(int64_t{n} + 1) != 0 || poles.allocate(n) != 0)
-        return ErrOutOfMemory;
+    RealVector c;
+    ComplexVector poles;
+    ScratchParts memory;
+    if (const ErrorCode failed = memory.take(Sized(c, int64_t{n} + 1), Sized(poles, n)))
+        return failed;
     double g = 1.0, scale = 0.0;
     if (const ErrorCode failed = ScaledPolynomial(n, c.data(), g))
         return failed;

@@ -35,48 +35,46 @@ auto Section(const DBL *a, const DBL *b, typename Element<Code>::type *state,
 
 template <int Order, ElementType Code>
 void RunSamples(const DBL *a, const DBL *b, typename Element<Code>::type *state, int32_t sections,
-                typename Element<Code>::type *x, int32_t n) {
-    for (std::ptrdiff_t i = 0; i < n; ++i) {
-        auto v = x[i];
+                VectorView<Code> x) {
+    for (auto &sample : x) {
+        auto v = sample;
         for (std::ptrdiff_t s = 0; s < sections; ++s)
             v = Section<Order, Code>(a + s * Order, b + s * (Order + 1), state + s * Order, v);
-        x[i] = Flushed(v);
+        sample = Flushed(v);
     }
 }
 
 // From so many samples on the start and the end of the lanes' wave cost little.
 constexpr int32_t worthLanes = 100;
 
-template <ElementType Code>
-ErrorCode Filter(const CascadeCoefficients &filter, typename Element<Code>::type *state,
-                 int32_t stateCount, typename Element<Code>::type *x, int32_t n) {
-    const int32_t order = SectionOrder(filter.form);
-    if (order == 0 || filter.aCount < order || filter.aCount % order != 0)
+} // namespace
+
+template <ElementType E>
+ErrorCode FilterIIRCascade(const CascadeCoefficients &filter, VectorView<E> state,
+                           VectorView<E> x) {
+    const auto &[a, b, form] = filter;
+    const int32_t order = SectionOrder(form);
+    if (order == 0 || a.size() < order || a.size() % order != 0)
         return ErrCoefficientSizes;
-    const int32_t sections = filter.aCount / order;
-    if (int64_t{sections} * (order + 1) != filter.bCount || stateCount != filter.aCount)
+    const auto sections = static_cast<int32_t>(a.size() / order);
+    if (int64_t{sections} * (order + 1) != b.size() || state.size() != a.size())
         return ErrCoefficientSizes;
-    if constexpr (Code == ElementType::DBL)
+    const auto n = static_cast<int32_t>(x.size());
+    if constexpr (E == ElementType::DBL)
         if (n >= worthLanes) {
-            RunCascadeInLanes({filter.a, filter.b, state, sections, order, x, n});
+            RunCascadeInLanes({a.data(), b.data(), state.data(), sections, order, x.data(), n});
             return 0;
         }
     if (order == 2)
-        RunSamples<2, Code>(filter.a, filter.b, state, sections, x, n);
+        RunSamples<2, E>(a.data(), b.data(), state.data(), sections, x);
     else
-        RunSamples<4, Code>(filter.a, filter.b, state, sections, x, n);
+        RunSamples<4, E>(a.data(), b.data(), state.data(), sections, x);
     return 0;
 }
 
-} // namespace
-
-ErrorCode FilterIIRCascade(const CascadeCoefficients &filter, DBL *state, int32_t stateCount,
-                           DBL *x, int32_t n) {
-    return Filter<ElementType::DBL>(filter, state, stateCount, x, n);
-}
-ErrorCode FilterIIRCascade(const CascadeCoefficients &filter, CDB *state, int32_t stateCount,
-                           CDB *x, int32_t n) {
-    return Filter<ElementType::CDB>(filter, state, stateCount, x, n);
-}
+template ErrorCode FilterIIRCascade(const CascadeCoefficients &filter, RealVector state,
+                                    RealVector x);
+template ErrorCode FilterIIRCascade(const CascadeCoefficients &filter, ComplexVector state,
+                                    ComplexVector x);
 
 } // namespace qx

@@ -1,7 +1,7 @@
 #ifndef QX_FILTERS_CASCADE_H
 #define QX_FILTERS_CASCADE_H
 
-#include "frame/elements.h"
+#include "frame/views.h"
 #include "frame/widths.h"
 #include "qx/errors.h"
 
@@ -16,25 +16,23 @@ namespace qx {
 //     w = v - a[0] state[0] - a[1] state[1] - ...        from left to right
 //     v = b[0] w + b[1] state[0] + ... + b[m] state[m-1]  on to the next section
 //
-// The memory takes flush(w), and the output of the last section is flushed, as spectra/recursion.h
-// tells.
+// The memory takes flush(w), and the output of the last section is flushed (spectra/recursion.h).
+
+enum SectionForm : int32_t { SecondOrderSections = 0, FourthOrderSections = 1 };
 
 // The order of the sections of each form; 0 where there is no such form.
-constexpr int32_t SectionOrder(int32_t form) { return form == 0 ? 2 : form == 1 ? 4 : 0; }
+constexpr int32_t SectionOrder(int32_t form) {
+    return form == SecondOrderSections ? 2 : form == FourthOrderSections ? 4 : 0;
+}
 
 struct CascadeCoefficients {
-    const DBL *a;
-    int32_t aCount;
-    const DBL *b;
-    int32_t bCount;
+    ConstRealVector a, b;
     int32_t form;
 };
 
-// ErrCoefficientSizes where the counts, that of the state included, do not fit the form.
-ErrorCode FilterIIRCascade(const CascadeCoefficients &filter, DBL *state, int32_t stateCount,
-                           DBL *x, int32_t n);
-ErrorCode FilterIIRCascade(const CascadeCoefficients &filter, CDB *state, int32_t stateCount,
-                           CDB *x, int32_t n);
+// In place. ErrCoefficientSizes where the sizes, that of the state included, do not fit the form.
+template <ElementType E>
+ErrorCode FilterIIRCascade(const CascadeCoefficients &filter, VectorView<E> state, VectorView<E> x);
 
 struct CascadeRun {
     const DBL *a, *b;

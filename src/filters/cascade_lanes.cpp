@@ -1,5 +1,5 @@
 #include "filters/cascade.h"
-#include "frame/lanes.h"
+#include "frame/lane_masks.h"
 
 // Sections s, s + 1, ... stand in the lanes of one or two vectors, and each is `lag` samples behind
 // its predecessor, so that all of them can take their next sample at once. A lag of 2 gives a value
@@ -23,26 +23,8 @@ inline double FlushOne(double value) { return __builtin_fabs(value) <= smallest 
 
 // Nearly always there is nothing to flush, and a branch costs the recursion no time.
 inline L FlushEach(L value) {
-    const L negated = -value;
-#ifdef __AVX2__
-    const auto magnitude = __builtin_ia32_maxpd256(value.v, negated.v);
-    const auto small = magnitude <= L(smallest).v;
-    const bool any = __builtin_ia32_movmskpd256(reinterpret_cast<typename L::Vector>(small)) != 0;
-#else
-    const auto magnitude = __builtin_ia32_maxpd(value.v, negated.v);
-    const auto small = magnitude <= L(smallest).v;
-    const bool any = __builtin_ia32_movmskpd(reinterpret_cast<typename L::Vector>(small)) != 0;
-#endif
-    return __builtin_expect(any, 0) ? L(small ? L(0.0).v : value.v) : value;
-}
-
-// The lanes moved up by one, with the last lane of `before` in the first.
-inline L MovedUp(L before, L value) {
-#ifdef __AVX2__
-    return L(__builtin_shufflevector(before.v, value.v, 3, 4, 5, 6));
-#else
-    return L(__builtin_shufflevector(before.v, value.v, 1, 2));
-#endif
+    const LaneMask<L> small = Magnitude(value) <= L(smallest);
+    return __builtin_expect(Any(small), 0) ? Select(small, L(0.0), value) : value;
 }
 
 template <int Order>

@@ -15,8 +15,8 @@ constexpr auto Real = ElementType::DBL;
 constexpr auto Complex = ElementType::CDB;
 
 template <ElementType Code>
-void Copy(const typename Element<Code>::type *from, std::ptrdiff_t count,
-          typename Element<Code>::type *to) {
+void CopyElements(const typename Element<Code>::type *from, std::ptrdiff_t count,
+                  typename Element<Code>::type *to) {
     std::memcpy(static_cast<void *>(to), from, sizeof *to * static_cast<std::size_t>(count));
 }
 
@@ -51,12 +51,15 @@ CDB Product(const CDB &b, const CDB &x) {
 double Sum(double a, double b) { return a + b; }
 CDB Sum(const CDB &a, const CDB &b) { return {a.re + b.re, a.im + b.im}; }
 
+template <ElementType C, ElementType X>
+using Output = VectorView<DirectForm<C, X>::output>;
+
 // The sums over x of one sample, which needs no memory: a filter may be called for each sample.
 template <ElementType C, ElementType X>
-void OneSum(const typename DirectForm<C, X>::C *b, int32_t nb, typename DirectForm<C, X>::X x,
-            typename DirectForm<C, X>::X *state, typename DirectForm<C, X>::Y *y) {
-    const std::ptrdiff_t past = nb - 1;
-    typename DirectForm<C, X>::Y sum = {};
+void OneSum(ConstVectorView<C> b, const typename Element<X>::type x,
+            typename Element<X>::type *state, typename Output<C, X>::T *y) {
+    const std::ptrdiff_t past = b.size() - 1;
+    typename Output<C, X>::T sum = {};
     for (std::ptrdiff_t k = past; k > 0; --k)
         sum = Sum(sum, Product(b[k], state[past - k]));
     *y = Sum(sum, Product(b[0], x));
@@ -70,53 +73,50 @@ void OneSum(const typename DirectForm<C, X>::C *b, int32_t nb, typename DirectFo
 // The sums over x alone, from 0.0 on. Those that reach into the state run over a copy that joins
 // the state and the first samples; they come last, for the others read these samples in place.
 template <ElementType C, ElementType X>
-ErrorCode Sums(const typename DirectForm<C, X>::C *b, int32_t nb,
-               const typename DirectForm<C, X>::X *x, int32_t n,
-               typename DirectForm<C, X>::X *state, typename DirectForm<C, X>::Y *y) {
+ErrorCode Sums(ConstVectorView<C> b, ConstVectorView<X> x, VectorView<X> state, Output<C, X> y) {
+    const std::ptrdiff_t n = x.size(), past = b.size() - 1;
+    QX_EXPECTS(n > 0 && past >= 0 && state.size() == past && y.size() == n);
     if (n == 1) {
-        OneSum<C, X>(b, nb, *x, state, y);
+        OneSum<C, X>(b, x[0], state.data(), y.data());
         return 0;
     }
-    const ConstantSteps<C> taps = {b + (nb - 1), -1};
-    const std::ptrdiff_t past = nb - 1;
-    const std::ptrdiff_t head = std::min<std::ptrdiff_t>(n, past);
+    const ConstantSteps<C> taps = {b.data() + past, -1};
+    const auto nb = static_cast<int32_t>(b.size());
+    const std::ptrdiff_t head = std::min(n, past);
     Scratch<X> memory;
     if (const ErrorCode failed = memory.allocate(2 * int64_t{past} + head))
         return failed;
-    typename DirectForm<C, X>::X *const joined = memory.data();
-    typename DirectForm<C, X>::X *const newest = joined + (past + head);
-    Copy<X>(state, past, joined);
-    Copy<X>(x, head, joined + past);
-    Copy<X>(n > past ? x + (n - past) : joined + n, past, newest);
+    auto *const joined = memory.data(), *const newest = joined + (past + head);
+    CopyElements<X>(state.data(), past, joined);
+    CopyElements<X>(x.data(), head, joined + past);
+    CopyElements<X>(n > past ? x.data() + (n - past) : joined + n, past, newest);
     if (n > past)
-        Slide(taps, nb, x, n, y + past, static_cast<int32_t>(n - past));
-    Slide(taps, nb, joined, past + head, y, static_cast<int32_t>(head));
-    Copy<X>(newest, past, state);
+        Slide(taps, nb, x.data(), n, y.data() + past, static_cast<int32_t>(n - past));
+    Slide(taps, nb, joined, past + head, y.data(), static_cast<int32_t>(head));
+    CopyElements<X>(newest, past, state.data());
     return memory.release();
 }
 
 } // namespace
 
-template <ElementType Coefficient, ElementType Signal>
-ErrorCode DirectForm<Coefficient, Signal>::fir(const C *b, int32_t nb, const X *x, int32_t n,
-                                               X *state, Y *y) {
-    if (n < 1 || nb < 1)
-        return ErrEmptyInput;
-    if (nb > 1)
-        return Sums<Coefficient, Signal>(b, nb, x, n, state, y);
-    for (std::ptrdiff_t t = 0; t < n; ++t)
+template <ElementType C, ElementType X>
+ErrorCode DirectForm<C, X>::fir(Coefficients b, ConstVectorView<X> x, VectorView<X> state,
+                                VectorView<output> y) {
+    QX_EXPECTS(b.size() > 0 && y.size() == x.size());
+    if (b.size() > 1)
+        return Sums<C, X>(b, x, state, y);
+    for (std::ptrdiff_t t = 0; t < x.size(); ++t)
         y[t] = Product(b[0], x[t]);
     return 0;
 }
 
-template <ElementType Coefficient, ElementType Signal>
-ErrorCode DirectForm<Coefficient, Signal>::iir(const C *b, int32_t nb, X *xState, const C *a,
-                                               int32_t na, Y *yState, const X *x, int32_t n, Y *y) {
-    if (n < 1 || na < 1 || nb < 1)
-        return ErrEmptyInput;
-    if (const ErrorCode failed = Sums<Coefficient, Signal>(b, nb, x, n, xState, y))
+template <ElementType C, ElementType X>
+ErrorCode DirectForm<C, X>::iir(Coefficients b, VectorView<X> xState, Coefficients a,
+                                VectorView<output> yState, ConstVectorView<X> x,
+                                VectorView<output> y) {
+    if (const ErrorCode failed = Sums<C, X>(b, x, xState, y))
         return failed;
-    RunRecursion(a, na, yState, y, n);
+    RunRecursion(a, yState, y);
     return 0;
 }
 

@@ -8,11 +8,12 @@
 
 namespace qx {
 
-ErrorCode DesignFIRWindowless(int32_t type, double fs, double fl, double fh, int32_t taps, DBL *h) {
+ErrorCode DesignFIRWindowless(FilterType type, const FilterBand &band, RealVector h) {
+    const auto taps = static_cast<int32_t>(h.size());
+    const double fs = band.fs, fl = band.fl;
     const bool isBand = type == Bandpass || type == Bandstop;
     const bool passesNyquist = type == Highpass || type == Bandstop;
-    if (!isBand)
-        fh = (fs * 0.5 + fl) * 0.5;
+    const double fh = isBand ? band.fh : (fs * 0.5 + fl) * 0.5;
     if (fl > fs * 0.5 || fh > fs * 0.5)
         return ErrAboveNyquist;
     if (fs <= 0.0 || fl <= 0.0 || (isBand && (fh <= 0.0 || fl >= fh)))
@@ -39,21 +40,20 @@ ErrorCode DesignFIRWindowless(int32_t type, double fs, double fl, double fh, int
 }
 
 ErrorCode DesignEquiripple(int32_t nBands, const RemezBand *bands, double fs, int32_t kind,
-                           int32_t n, DBL *h, double *ripple, int32_t maxIterations) {
-    Scratch<ElementType::DBL> desired, weight, edges;
-    const int64_t count = nBands > 0 ? nBands : 0;
-    if (desired.allocate(count) != 0 || weight.allocate(count) != 0 ||
-        edges.allocate(2 * count) != 0)
-        return ErrOutOfMemory;
-    for (std::ptrdiff_t b = 0; b < count; ++b) {
+                           RealVector h, double *ripple, int32_t maxIterations) {
+    RealVector desired, weight, edges;
+    ScratchParts memory;
+    if (const ErrorCode failed = memory.take(Sized(desired, nBands), Sized(weight, nBands),
+                                             Sized(edges, 2 * int64_t{nBands})))
+        return failed;
+    for (std::ptrdiff_t b = 0; b < nBands; ++b) {
         desired[b] = bands[b].desired;
         weight[b] = bands[b].weight;
         edges[2 * b] = bands[b].fLow;
         edges[2 * b + 1] = bands[b].fHigh;
     }
-    const int32_t type = kind < 0 || kind > 2 ? 0 : kind + 1;
-    return RemezDesign(nBands, desired.data(), weight.data(), fs, edges.data(), type, n, h, ripple,
-                       maxIterations);
+    const auto type = static_cast<RemezType>(kind < 0 || kind > 2 ? 0 : kind + 1);
+    return RemezDesign({desired, weight, edges, fs, type}, h, ripple, maxIterations);
 }
 
 } // namespace qx

@@ -4,61 +4,39 @@
 #include "filters/section_forms.h"
 #include "frame/scratch.h"
 
-#include <initializer_list>
 #include <limits>
 
 namespace qx {
 
 namespace {
 
-ErrorCode FirstOf(std::initializer_list<ErrorCode> codes) {
-    for (const ErrorCode code : codes)
-        if (code != 0)
-            return code;
-    return 0;
-}
-
 bool IsBand(int32_t type) { return type == Bandpass || type == Bandstop; }
 
-ErrorCode CheckOrderAndBand(const FilterBand &band, const IIRDesignRequest &request) {
-    if (request.order < 1)
-        return ErrOrderNotPositive;
-    const bool isRising = !(band.fl >= band.fh); // NaN passes
-    return band.fl <= 0.0 || band.fh <= 0.0 || !isRising || band.fs <= 0.0 ? ErrBadCutoff : 0;
-}
-
-ErrorCode CheckNyquist(const FilterBand &band) {
-    const double nyquist = band.fs * 0.5;
-    return band.fh > nyquist || band.fl > nyquist ? ErrAboveNyquist : 0;
-}
-
-ErrorCode CheckShape(const IIRDesignRequest &request) {
+[[maybe_unused]] bool HasRoom(const IIRDesignRequest &request) {
     const CascadeSizes sizes = SizesOfCascade(request.type, request.order, request.form);
-    if (request.type < Lowpass || request.type > Bandstop || SectionOrder(request.form) == 0)
-        return ErrInvalidSelector;
-    const bool fits = sizes.a > 0 && request.aCount >= sizes.a && request.bCount >= sizes.b;
-    return fits ? 0 : ErrCoefficientSizes;
+    return sizes.a > 0 && request.a.size() >= sizes.a && request.b.size() >= sizes.b;
 }
 
 // Runs the prototype into the request's arrays, through the native form where another is wanted.
 template <class Prototype>
 ErrorCode Design(const FilterBand &band, const IIRDesignRequest &request,
                  const Prototype &prototype) {
+    QX_EXPECTS(HasRoom(request));
     const int32_t native = NativeForm(request.type);
     if (request.form == native) {
-        DigitalSections sections(request.type, band, request.a, request.b);
+        DigitalSections sections(request.type, band, request.a.data(), request.b.data());
         return prototype(sections);
     }
     const CascadeSizes sizes = SizesOfCascade(request.type, request.order, native);
-    Scratch<ElementType::DBL> a, b;
-    if (a.allocate(sizes.a) != 0 || b.allocate(sizes.b) != 0)
-        return ErrOutOfMemory;
+    RealVector a, b;
+    ScratchParts memory;
+    if (const ErrorCode failed = memory.take(Sized(a, sizes.a), Sized(b, sizes.b)))
+        return failed;
     DigitalSections sections(request.type, band, a.data(), b.data());
     if (const ErrorCode failed = prototype(sections))
         return failed;
     const auto convert = native == SecondOrderSections ? SecondToFourthOrder : FourthToSecondOrder;
-    return convert({a.data(), sizes.a, b.data(), sizes.b, native},
-                   {request.a, request.aCount, request.b, request.bCount});
+    return convert({a, b, native}, {request.a, request.b});
 }
 
 GainIn RippleGain(int32_t type) {
@@ -80,9 +58,6 @@ CascadeSizes SizesOfCascade(int32_t type, int32_t order, int32_t form) {
 }
 
 ErrorCode DesignButterworth(const FilterBand &band, const IIRDesignRequest &request) {
-    if (const ErrorCode failed =
-            FirstOf({CheckOrderAndBand(band, request), CheckNyquist(band), CheckShape(request)}))
-        return failed;
     return Design(band, request, [&](DigitalSections &sections) -> ErrorCode {
         ButterworthPrototype(request.order, sections);
         return 0;
@@ -90,10 +65,6 @@ ErrorCode DesignButterworth(const FilterBand &band, const IIRDesignRequest &requ
 }
 
 ErrorCode DesignChebyshev(const FilterBand &band, double ripple, const IIRDesignRequest &request) {
-    if (const ErrorCode failed =
-            FirstOf({CheckOrderAndBand(band, request), CheckNyquist(band),
-                     ripple <= 0.0 ? ErrRippleNotPositive : 0, CheckShape(request)}))
-        return failed;
     return Design(band, request, [&](DigitalSections &sections) -> ErrorCode {
         ChebyshevPrototype(request.order, ripple, RippleGain(request.type), sections);
         return 0;
@@ -102,11 +73,6 @@ ErrorCode DesignChebyshev(const FilterBand &band, double ripple, const IIRDesign
 
 ErrorCode DesignInvChebyshev(const FilterBand &band, double attenuation,
                              const IIRDesignRequest &request) {
-    // kept: unlike in the elliptic design, the attenuation comes before the Nyquist frequency.
-    if (const ErrorCode failed = FirstOf({CheckOrderAndBand(band, request),
-                                          attenuation <= 0.0 ? ErrAttenuationNotPositive : 0,
-                                          CheckNyquist(band), CheckShape(request)}))
-        return failed;
     return Design(band, request, [&](DigitalSections &sections) -> ErrorCode {
         InvChebyshevPrototype(request.order, attenuation, sections);
         return 0;
@@ -115,12 +81,6 @@ ErrorCode DesignInvChebyshev(const FilterBand &band, double attenuation,
 
 ErrorCode DesignElliptic(const FilterBand &band, double ripple, double attenuation,
                          const IIRDesignRequest &request) {
-    if (const ErrorCode failed =
-            FirstOf({CheckOrderAndBand(band, request), CheckNyquist(band),
-                     ripple <= 0.0 ? ErrRippleNotPositive : 0,
-                     attenuation <= 0.0 ? ErrAttenuationNotPositive : 0,
-                     ripple >= attenuation ? ErrRippleAboveAttenuation : 0, CheckShape(request)}))
-        return failed;
     return Design(band, request, [&](DigitalSections &sections) -> ErrorCode {
         EllipticPrototype(request.order, ripple, attenuation, sections);
         return 0;
@@ -128,9 +88,6 @@ ErrorCode DesignElliptic(const FilterBand &band, double ripple, double attenuati
 }
 
 ErrorCode DesignBessel(const FilterBand &band, const IIRDesignRequest &request) {
-    if (const ErrorCode failed =
-            FirstOf({CheckOrderAndBand(band, request), CheckNyquist(band), CheckShape(request)}))
-        return failed;
     return Design(band, request, [&](DigitalSections &sections) {
         return BesselPrototype(request.order, sections);
     });

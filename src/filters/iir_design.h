@@ -10,14 +10,9 @@ namespace qx {
 // of the analog filter, whose order a band filter has twice.
 struct IIRDesignRequest {
     int32_t type, order;
-    int32_t aCount;
-    DBL *a;
-    int32_t bCount;
-    DBL *b;
+    RealVector a, b; // of SizesOfCascade or more
     int32_t form;
 };
-
-enum SectionForm : int32_t { SecondOrderSections = 0, FourthOrderSections = 1 };
 
 // The form that the sections of a type come in: a pair of poles becomes two pairs in a band filter.
 constexpr int32_t NativeForm(int32_t type) {
@@ -30,10 +25,8 @@ struct CascadeSizes {
 };
 CascadeSizes SizesOfCascade(int32_t type, int32_t order, int32_t form);
 
-// Ripple and attenuation in decibels. ErrOrderNotPositive; ErrBadCutoff (a frequency that is not
-// above 0, fl not below fh); ErrAboveNyquist; ErrRippleNotPositive; ErrAttenuationNotPositive
-// (inverse Chebyshev: before ErrAboveNyquist); ErrRippleAboveAttenuation; ErrInvalidSelector;
-// ErrCoefficientSizes; ErrOutOfMemory. NaN passes and makes all values NaN.
+// Ripple and attenuation in decibels. The band is one that the type can have, and the type and the
+// form exist. ErrOutOfMemory. NaN makes all values NaN.
 ErrorCode DesignButterworth(const FilterBand &band, const IIRDesignRequest &request);
 ErrorCode DesignChebyshev(const FilterBand &band, double ripple, const IIRDesignRequest &request);
 ErrorCode DesignInvChebyshev(const FilterBand &band, double attenuation,

@@ -1,7 +1,6 @@
 #include "filters/median_filter.h"
 
 #include "frame/constants.h"
-#include "frame/elements.h"
 #include "frame/scratch.h"
 #include "stats/order.h"
 
@@ -18,10 +17,10 @@ struct Job {
     std::ptrdiff_t width() const { return std::ptrdiff_t{left} + right + 1; }
 };
 
-bool HasNaN(const DBL *x, int32_t n) {
+bool HasNaN(ConstRealVector x) {
     int32_t count = 0;
-    for (int32_t i = 0; i < n; ++i)
-        count += x[i] != x[i];
+    for (const double value : x)
+        count += value != value;
     return count != 0;
 }
 
@@ -210,24 +209,20 @@ private:
 
 } // namespace
 
-ErrorCode MedianFilterRun(const DBL *x, int32_t n, int32_t leftRank, int32_t rightRank, DBL *y) {
-    if (leftRank < 0)
-        return ErrNegativeCount;
-    if (rightRank < 0)
-        rightRank = leftRank;
-    if (n > 0 && n <= rightRank)
-        return ErrSizesDisagree;
+ErrorCode MedianFilterRun(ConstRealVector x, int32_t leftRank, int32_t rightRank, RealVector y) {
+    const auto n = static_cast<int32_t>(x.size());
+    QX_EXPECTS(leftRank >= 0 && rightRank >= 0 && (n == 0 || n > rightRank) && y.size() == n);
     if (n < 1 || (leftRank == 0 && rightRank == 0)) {
         if (n > 0)
-            std::memmove(y, x, static_cast<std::size_t>(n) * sizeof(DBL));
+            std::memmove(y.data(), x.data(), static_cast<std::size_t>(n) * sizeof(DBL));
         return 0;
     }
     if (leftRank / 4 > n) { // the zeros before x outnumber it, and the median is always one of them
-        Fill(y, n, 0.0);
+        Fill(y.data(), n, 0.0);
         return 0;
     }
-    const Job job = {x, n, leftRank, rightRank, y};
-    const bool hasNaN = HasNaN(x, n);
+    const Job job = {x.data(), n, leftRank, rightRank, y.data()};
+    const bool hasNaN = HasNaN(x);
     if (!hasNaN && StretchedFilter::pays(job))
         return StretchedFilter(job).run();
     return RunOneByOne(job, hasNaN);

@@ -1,24 +1,21 @@
 #ifndef QX_FILTERS_MEDIAN_FILTER_H
 #define QX_FILTERS_MEDIAN_FILTER_H
 
+#include "frame/views.h"
 #include "frame/widths.h"
 #include "qx/errors.h"
-#include "qx/types.h"
 
 #include <cstdint>
 
 namespace qx {
 
 // y[i] is the median of x[i - leftRank] to x[i + rightRank], with zeros before and behind x; of an
-// even number of values it is the mean of the two in the middle. A rightRank below 0 is leftRank.
-// y may be x.
+// even number of values it is the mean of the two in the middle. No rank is below 0, and x is
+// longer than rightRank or empty. y may be x.
 //
-// Zeros of either sign are equal, and among them the older one stands first. A NaN puts the window
-// into disorder for good: see SortedWindow in the source.
-//
-// ErrNegativeCount (leftRank is below 0), ErrSizesDisagree (n is not 0 and not above rightRank),
-// ErrOutOfMemory.
-ErrorCode MedianFilterRun(const DBL *x, int32_t n, int32_t leftRank, int32_t rightRank, DBL *y);
+// Zeros of either sign are equal, and among them the older one comes first. A NaN puts the window
+// into disorder for good: see SortedWindow in the source. ErrOutOfMemory.
+ErrorCode MedianFilterRun(ConstRealVector x, int32_t leftRank, int32_t rightRank, RealVector y);
 
 // So many stretches of a signal are filtered at once.
 inline constexpr int32_t medianStretches = 8;

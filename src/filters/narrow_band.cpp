@@ -144,6 +144,9 @@ Stages EstimateBandStages(const LowpassProblem &problem, double center) {
 struct BandTable {
     int32_t count;
     double gains[3], weights[3], edges[6];
+    RemezBands of(double fs) const {
+        return {{gains, count}, {weights, count}, {edges, 2 * count}, fs, RemezMultiband};
+    }
 };
 
 BandTable ModelBands(const LowpassProblem &problem, const Stages &stages) {
@@ -177,12 +180,11 @@ ErrorCode DesignStage(const LowpassProblem &problem, const BandTable &bands, int
     // Only an odd length has its middle on a tap and may pass the Nyquist frequency.
     const auto shaped = [&](int32_t n) { return problem.kind == NarrowLowpass ? n : n | 1; };
     for (int32_t n = shaped(count);; n = shaped(Truncated(std::ceil(1.05 * n)))) {
-        if (taps.allocate(n) != 0)
-            return ErrOutOfMemory;
+        if (const ErrorCode failed = taps.allocate(n))
+            return failed;
         double ripple = 0.0;
         if (const ErrorCode failed =
-                RemezDesign(bands.count, bands.gains, bands.weights, problem.fs, bands.edges,
-                            RemezMultiband, n, taps.data(), &ripple, 0))
+                RemezDesign(bands.of(problem.fs), {taps.data(), n}, &ripple, 0))
             return failed;
         count = n;
         if (!(ripple > problem.target()))
@@ -247,61 +249,80 @@ ErrorCode DesignNarrowFIR(const NarrowFIRGoal &goal, NarrowFIRBlock &block) {
 }
 
 bool NarrowFIRFilter::isComplete() const {
-    return modelCount > 0 && (M < 2 || interpolatorCount > 0);
+    return !model.isEmpty() && (M < 2 || !interpolator.isEmpty());
 }
 
-int64_t NarrowFIRFilter::outputCount(int32_t n) const {
+int64_t NarrowFIRFilter::outputCount(std::ptrdiff_t n) const {
     if (M < 2)
-        return int64_t{modelCount} + n - 1;
-    return (int64_t{modelCount} - 1) * M + interpolatorCount + n - 1;
+        return int64_t{model.size()} + n - 1;
+    return (int64_t{model.size()} - 1) * M + interpolator.size() + n - 1;
 }
 
 namespace {
 
 // The stretched model meets every M-th value of what the interpolator gives.
-ErrorCode FilterInStages(const DBL *x, int32_t n, const NarrowFIRFilter &filter, DBL *y) {
-    const int64_t smoothCount = int64_t{n} + filter.interpolatorCount - 1;
-    const int64_t count = filter.outputCount(n);
-    Scratch<ElementType::DBL> smooth;
-    if (smooth.allocate(smoothCount) != 0)
-        return ErrOutOfMemory;
-    if (const ErrorCode failed = ConvolveReal(x, n, filter.interpolator, filter.interpolatorCount,
-                                              ConvolveDirectly, smooth.data()))
+ErrorCode FilterInStages(ConstRealVector x, const NarrowFIRFilter &filter, RealVector y) {
+    const std::ptrdiff_t smoothCount = x.size() + filter.interpolator.size() - 1;
+    RealVector smooth;
+    ScratchParts memory;
+    if (const ErrorCode failed = memory.take(Sized(smooth, smoothCount)))
         return failed;
-    const int32_t M = filter.M, taps = filter.modelCount;
+    if (const ErrorCode failed = ConvolveReal(x, filter.interpolator, ConvolveDirectly, smooth))
+        return failed;
+    const int32_t M = filter.M;
+    const auto taps = static_cast<int32_t>(filter.model.size());
     const auto ofPhase = [M](int64_t values, int32_t phase) {
         return values > phase ? (values - phase + M - 1) / M : 0;
     };
-    for (int32_t phase = 0; phase < M && phase < count; ++phase) {
-        SlidingJob<ElementType::DBL> job{};
-        job.taps = {filter.model + taps - 1, -1};
-        job.tapCount = taps;
-        job.signal = {smooth.data() + phase, M};
-        job.length = ofPhase(smoothCount, phase);
-        job.first = 1 - int64_t{taps};
-        job.out = {y + phase, M};
-        job.count = static_cast<int32_t>(ofPhase(count, phase));
-        SlidingSums(job);
-    }
+    for (int32_t phase = 0; phase < M && phase < y.size(); ++phase)
+        SlidingSums({.taps = {filter.model.data() + (taps - 1), -1},
+                     .tapCount = taps,
+                     .signal = {smooth.data() + phase, M},
+                     .length = ofPhase(smoothCount, phase),
+                     .first = 1 - int64_t{taps},
+                     .out = {y.data() + phase, M},
+                     .count = static_cast<int32_t>(ofPhase(y.size(), phase))});
+    return 0;
+}
+
+ErrorCode FilterReal(ConstRealVector x, const NarrowFIRFilter &filter, RealVector y) {
+    if (const ErrorCode failed = filter.M > 1 ? FilterInStages(x, filter, y)
+                                              : ConvolveReal(x, filter.model, ConvolveDirectly, y))
+        return failed;
+    if (filter.kind < NarrowBandstop || filter.kind > WideHighpass)
+        return 0;
+    const std::ptrdiff_t delay = (y.size() - x.size()) / 2;
+    for (std::ptrdiff_t i = 0; i < x.size(); ++i)
+        y[delay + i] += x[i];
     return 0;
 }
 
 } // namespace
 
-ErrorCode FilterNarrowFIR(const DBL *x, int32_t n, const NarrowFIRFilter &filter, DBL *y) {
-    const bool isStaged = filter.M > 1;
-    if (n < 1 || !filter.isComplete())
-        return ErrEmptyInput;
-    if (const ErrorCode failed =
-            isStaged ? FilterInStages(x, n, filter, y)
-                     : ConvolveReal(x, n, filter.model, filter.modelCount, ConvolveDirectly, y))
-        return failed;
-    if (filter.kind < NarrowBandstop || filter.kind > WideHighpass)
+template <ElementType E>
+ErrorCode FilterNarrowFIR(ConstVectorView<E> x, const NarrowFIRFilter &filter, VectorView<E> y) {
+    QX_EXPECTS(!x.isEmpty() && filter.isComplete() && y.size() == filter.outputCount(x.size()));
+    if constexpr (E == ElementType::DBL) {
+        return FilterReal(x, filter, y);
+    } else { // the parts one after the other
+        RealVector part, filtered;
+        ScratchParts memory;
+        if (const ErrorCode failed = memory.take(Sized(part, x.size()), Sized(filtered, y.size())))
+            return failed;
+        for (DBL CDB::*which : {&CDB::re, &CDB::im}) {
+            for (std::ptrdiff_t i = 0; i < x.size(); ++i)
+                part[i] = x[i].*which;
+            if (const ErrorCode failed = FilterReal(part, filter, filtered))
+                return failed;
+            for (std::ptrdiff_t i = 0; i < y.size(); ++i)
+                y[i].*which = filtered[i];
+        }
         return 0;
-    const int64_t delay = (filter.outputCount(n) - n) / 2;
-    for (std::ptrdiff_t i = 0; i < n; ++i)
-        y[delay + i] += x[i];
-    return 0;
+    }
 }
+
+template ErrorCode FilterNarrowFIR(ConstRealVector x, const NarrowFIRFilter &filter, RealVector y);
+template ErrorCode FilterNarrowFIR(ConstComplexVector x, const NarrowFIRFilter &filter,
+                                   ComplexVector y);
 
 } // namespace qx

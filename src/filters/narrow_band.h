@@ -2,6 +2,7 @@
 #define QX_FILTERS_NARROW_BAND_H
 
 #include "frame/scratch.h"
+#include "frame/views.h"
 
 namespace qx {
 
@@ -38,16 +39,17 @@ ErrorCode DesignNarrowFIR(const NarrowFIRGoal &goal, NarrowFIRBlock &block);
 
 struct NarrowFIRFilter {
     int32_t kind, M; // an M below 2 means no interpolator
-    int32_t modelCount, interpolatorCount;
-    const DBL *model, *interpolator;
+    ConstRealVector model, interpolator;
 
+    // Has a model and, with M above 1, an interpolator.
     bool isComplete() const;
     // Of the output for n values: the full convolution with both.
-    int64_t outputCount(int32_t n) const;
+    int64_t outputCount(std::ptrdiff_t n) const;
 };
 
-// ErrEmptyInput: no x, no model or, with M above 1, no interpolator. ErrOutOfMemory.
-ErrorCode FilterNarrowFIR(const DBL *x, int32_t n, const NarrowFIRFilter &filter, DBL *y);
+// x, which is not empty, through a filter that is complete. ErrOutOfMemory.
+template <ElementType E>
+ErrorCode FilterNarrowFIR(ConstVectorView<E> x, const NarrowFIRFilter &filter, VectorView<E> y);
 
 } // namespace qx
 

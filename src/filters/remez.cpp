@@ -14,31 +14,19 @@ constexpr int32_t gridDensity = 16; // points per extremum
 constexpr int32_t mostExtrema = 2048;
 constexpr int32_t usualRounds = 100;
 
-struct Bands {
-    int32_t count;
-    const DBL *desired, *weight, *edges;
-    double fs;
-    int32_t type;
-
-    double lower(int32_t band) const { return edges[2 * std::ptrdiff_t{band}] / fs; }
-    double upper(int32_t band) const { return edges[2 * std::ptrdiff_t{band} + 1] / fs; }
-    double firstEdge() const { return edges[0]; }
-    double lastEdge() const { return edges[2 * std::ptrdiff_t{count} - 1]; }
-};
-
 ErrorCode CheckNumber(double value, bool mayBeZero) {
     if (!std::isfinite(value))
         return ErrBadDesignField;
     return value < 0.0 || (value == 0.0 && !mayBeZero) ? ErrBadCutoff : 0;
 }
 
-ErrorCode CheckNumbers(const Bands &bands) {
+ErrorCode CheckNumbers(const RemezBands &bands) {
     if (const ErrorCode failed = CheckNumber(bands.fs, false))
         return failed;
-    for (int64_t i = 0; i < 2 * int64_t{bands.count}; ++i)
-        if (const ErrorCode failed = CheckNumber(bands.edges[i], true))
+    for (const double edge : bands.edges)
+        if (const ErrorCode failed = CheckNumber(edge, true))
             return failed;
-    for (int32_t b = 0; b < bands.count; ++b) {
+    for (std::ptrdiff_t b = 0; b < bands.count(); ++b) {
         if (const ErrorCode failed = CheckNumber(bands.weight[b], false))
             return failed;
         if (const ErrorCode failed = CheckNumber(bands.desired[b], true))
@@ -48,14 +36,14 @@ ErrorCode CheckNumbers(const Bands &bands) {
 }
 
 // The ends of the bands against the zeros that the symmetry of the taps forces on the response.
-ErrorCode CheckEnds(const Bands &bands, bool isOdd) {
+ErrorCode CheckEnds(const RemezBands &bands, bool isOdd) {
     const double gap = std::fabs(bands.lastEdge() - 0.5 * bands.fs);
     if (bands.type == RemezHilbert ? bands.firstEdge() == 0.0 : bands.firstEdge() != 0.0)
         return ErrBadDesignField;
     if (bands.type == RemezMultiband) {
         if (gap > 0.001)
             return ErrBadDesignField;
-        return !isOdd && bands.desired[bands.count - 1] != 0.0 ? ErrBadTapCount : 0;
+        return !isOdd && bands.desired[bands.count() - 1] != 0.0 ? ErrBadTapCount : 0;
     }
     if (bands.type != RemezDifferentiator && bands.type != RemezHilbert)
         return ErrBadDesignField;
@@ -63,14 +51,14 @@ ErrorCode CheckEnds(const Bands &bands, bool isOdd) {
     return (isOdd ? gap < leastGapOfOdd : gap > 0.001) ? ErrBadDesignField : 0;
 }
 
-ErrorCode CheckBands(const Bands &bands, int32_t n) {
-    if (bands.count < 1)
+ErrorCode CheckBands(const RemezBands &bands, int32_t n) {
+    if (bands.count() < 1)
         return ErrEmptyInput;
     if (const ErrorCode failed = CheckNumbers(bands))
         return failed;
     if (bands.lastEdge() / bands.fs > 0.5)
         return ErrAboveNyquist;
-    for (int64_t i = 1; i < 2 * int64_t{bands.count}; ++i)
+    for (std::ptrdiff_t i = 1; i < bands.edges.size(); ++i)
         if (bands.edges[i] <= bands.edges[i - 1])
             return ErrBadCutoff;
     return CheckEnds(bands, n % 2 != 0);
@@ -78,15 +66,14 @@ ErrorCode CheckBands(const Bands &bands, int32_t n) {
 
 // Points of the frequency axis, with what is desired there and its weight.
 struct Grid {
-    Scratch<ElementType::DBL> frequency, desired, weight;
+    RealVector frequency, desired, weight;
     int32_t size = 0;
 
     ErrorCode allocate(int64_t capacity) {
-        const bool isRefused = frequency.allocate(capacity) != 0 ||
-                               desired.allocate(capacity) != 0 || weight.allocate(capacity) != 0;
-        return isRefused ? ErrOutOfMemory : 0;
+        return memory.take(Sized(frequency, capacity), Sized(desired, capacity),
+                           Sized(weight, capacity));
     }
-    void add(const Bands &bands, int32_t band, double f) {
+    void add(const RemezBands &bands, std::ptrdiff_t band, double f) {
         const double gain = bands.desired[band], w = bands.weight[band];
         const bool isSlope = bands.type == RemezDifferentiator;
         frequency[size] = f;
@@ -94,15 +81,19 @@ struct Grid {
         weight[size] = isSlope && gain >= 0.0001 ? w / f : w;
         ++size;
     }
+
+private:
+    ScratchParts memory;
 };
 
 // Each band from its lower edge in steps; its last point is its upper edge instead.
-ErrorCode LayGrid(const Bands &bands, int32_t nfcns, Grid &grid) {
+ErrorCode LayGrid(const RemezBands &bands, int32_t nfcns, Grid &grid) {
     const double step = 0.5 / (gridDensity * nfcns);
     // All bands together are no wider than one half; rounding and the edges add two a band.
-    if (grid.allocate(int64_t{gridDensity} * nfcns + 2 * int64_t{bands.count} + 1) != 0)
-        return ErrOutOfMemory;
-    for (int32_t b = 0; b < bands.count; ++b) {
+    if (const ErrorCode failed =
+            grid.allocate(int64_t{gridDensity} * nfcns + 2 * int64_t{bands.count()} + 1))
+        return failed;
+    for (std::ptrdiff_t b = 0; b < bands.count(); ++b) {
         double f = bands.lower(b);
         if (b == 0 && bands.type != RemezMultiband && step > f)
             f = step;
@@ -118,14 +109,14 @@ ErrorCode LayGrid(const Bands &bands, int32_t nfcns, Grid &grid) {
 
 // A response of n taps is a cosine polynomial times a factor, which goes into what is desired and
 // into the weights.
-double SymmetryFactor(const Bands &bands, bool isOdd, double f) {
+double SymmetryFactor(const RemezBands &bands, bool isOdd, double f) {
     if (bands.type == RemezMultiband)
         return isOdd ? 1.0 : std::cos(kPi * f);
     return isOdd ? std::sin(kTwoPi * f) : std::sin(kPi * f);
 }
 
 // ErrBadDesignField where a weight vanishes: the deviation allowed by it would be no number.
-ErrorCode DivideByFactor(const Bands &bands, bool isOdd, int32_t nfcns, Grid &grid) {
+ErrorCode DivideByFactor(const RemezBands &bands, bool isOdd, int32_t nfcns, Grid &grid) {
     const bool isZeroAtNyquist = (bands.type == RemezMultiband) != isOdd;
     const double step = 0.5 / (gridDensity * nfcns);
     if (isZeroAtNyquist && grid.frequency[grid.size - 1] > 0.5 - step)
@@ -174,8 +165,9 @@ private:
 
     Grid &grid_;
     int32_t r_;
-    Scratch<ElementType::I32> ext_, exponent_, knownSince_;
-    Scratch<ElementType::DBL> x_, y_, ad_, cosine_, error_;
+    ScratchParts memory_;
+    I32 *ext_, *exponent_, *knownSince_;
+    RealVector x_, y_, ad_, cosine_, error_;
     double deviation_ = -1.0, nut_ = 1.0;
     int32_t changes_ = 0, round_ = 0;
 };
@@ -183,11 +175,10 @@ private:
 ErrorCode Exchange::prepare() {
     const int32_t groups = (grid_.size + interpolationGroup - 1) / interpolationGroup;
     const int64_t evaluated = int64_t{groups} * interpolationGroup;
-    if (ext_.allocate(r_) != 0 || exponent_.allocate(r_) != 0 ||
-        knownSince_.allocate(groups) != 0 || x_.allocate(r_) != 0 || y_.allocate(r_) != 0 ||
-        ad_.allocate(r_) != 0 || cosine_.allocate(evaluated) != 0 ||
-        error_.allocate(evaluated) != 0)
-        return ErrOutOfMemory;
+    if (const ErrorCode failed = memory_.take(
+            Sized(ext_, r_), Sized(exponent_, r_), Sized(knownSince_, groups), Sized(x_, r_),
+            Sized(y_, r_), Sized(ad_, r_), Sized(cosine_, evaluated), Sized(error_, evaluated)))
+        return failed;
     for (int32_t k = 0; k < groups * interpolationGroup; ++k)
         cosine_[k] = std::cos(kTwoPi * grid_.frequency[std::min(k, grid_.size - 1)]);
     for (int32_t group = 0; group < groups; ++group)
@@ -201,7 +192,7 @@ ErrorCode Exchange::prepare() {
 
 // All weights get one power of 2 in common, which cancels where they are used.
 ErrorCode Exchange::formWeights() {
-    MultiplyDistances({x_.data(), r_, ad_.data(), exponent_.data()});
+    MultiplyDistances({x_.data(), r_, ad_.data(), exponent_});
     int32_t least = 0;
     for (int32_t j = 0; j < r_; ++j) {
         if (ad_[j] == 0.0)
@@ -399,8 +390,7 @@ struct Mapping {
 // recurrence on whole polynomials. `work` holds 2 n values.
 void MapBack(const Mapping &mapping, int32_t n, DBL *alpha, DBL *work) {
     DBL *p = work, *q = work + n; // the sums from k on, and from k + 1 on
-    for (int32_t i = 0; i < 2 * n; ++i)
-        work[i] = 0.0;
+    Fill(work, 2 * std::ptrdiff_t{n}, 0.0);
     for (int32_t k = n - 1; k >= 0; --k) {
         // (1 or 2) (aa x + bb) p - q + alpha[k]; x T_i is half of T_(i-1) + T_(i+1).
         const double twice = k == 0 ? 1.0 : 2.0;
@@ -423,9 +413,11 @@ void MapBack(const Mapping &mapping, int32_t n, DBL *alpha, DBL *work) {
 ErrorCode FindCoefficients(const Exchange &exchange, const Mapping &mapping, bool isMapped,
                            int32_t nfcns, DBL *alpha) {
     const int32_t period = 2 * nfcns - 1;
-    Scratch<ElementType::DBL> cosines, samples;
-    if (cosines.allocate(period) != 0 || samples.allocate(2 * int64_t{nfcns}) != 0)
-        return ErrOutOfMemory;
+    RealVector cosines, samples;
+    ScratchParts memory;
+    if (const ErrorCode failed =
+            memory.take(Sized(cosines, period), Sized(samples, 2 * int64_t{nfcns})))
+        return failed;
     for (int32_t j = 0; j < period; ++j)
         cosines[j] = std::cos(kTwoPi * j / period);
     for (int32_t j = 0; j < nfcns; ++j)
@@ -470,16 +462,16 @@ void FormTaps(const DBL *alpha, int32_t nfcns, int32_t type, int32_t n, DBL *h) 
 
 } // namespace
 
-ErrorCode RemezDesign(int32_t nBands, const DBL *desired, const DBL *weight, double fs,
-                      const DBL *edges, int32_t type, int32_t n, DBL *h, double *ripple,
+ErrorCode RemezDesign(const RemezBands &bands, RealVector h, double *ripple,
                       int32_t maxIterations) {
+    QX_EXPECTS(bands.weight.size() == bands.count() && bands.edges.size() == 2 * bands.count());
+    const auto n = static_cast<int32_t>(h.size());
     if (n < 3)
         return ErrBadDesignField;
-    const Bands bands{nBands, desired, weight, edges, fs, type};
     if (const ErrorCode failed = CheckBands(bands, n))
         return failed;
     const bool isOdd = n % 2 != 0;
-    const int32_t nfcns = n / 2 + (isOdd && type == RemezMultiband ? 1 : 0);
+    const int32_t nfcns = n / 2 + (isOdd && bands.type == RemezMultiband ? 1 : 0);
     if (nfcns + 2 >= mostExtrema)
         return ErrOutOfMemory;
 
@@ -495,14 +487,14 @@ ErrorCode RemezDesign(int32_t nBands, const DBL *desired, const DBL *weight, dou
             exchange.run(maxIterations > 0 ? maxIterations : usualRounds, ripple))
         return failed;
 
-    const bool isMapped = type == RemezHilbert;
+    const bool isMapped = bands.type == RemezHilbert;
     Scratch<ElementType::DBL> alpha;
-    if (alpha.allocate(nfcns) != 0)
-        return ErrOutOfMemory;
+    if (const ErrorCode failed = alpha.allocate(nfcns))
+        return failed;
     if (const ErrorCode failed = FindCoefficients(exchange, isMapped ? Mapping(grid) : Mapping(),
                                                   isMapped, nfcns, alpha.data()))
         return failed;
-    FormTaps(alpha.data(), nfcns, type, n, h);
+    FormTaps(alpha.data(), nfcns, bands.type, n, h.data());
     *ripple = exchange.deviation();
     return 0;
 }

@@ -1,7 +1,7 @@
 #ifndef QX_FILTERS_REMEZ_H
 #define QX_FILTERS_REMEZ_H
 
-#include "frame/elements.h"
+#include "frame/views.h"
 #include "frame/widths.h"
 #include "qx/errors.h"
 
@@ -16,10 +16,23 @@ namespace qx {
 
 enum RemezType : int32_t { RemezMultiband = 1, RemezDifferentiator = 2, RemezHilbert = 3 };
 
-// n taps into h, symmetric for a multiband filter, antisymmetric for the others; the deviation
-// into *ripple. The bands have edges[2 b] and edges[2 b + 1], in the unit of fs, a gain (of a
-// differentiator: a slope in cycles per sample) and a weight (of a differentiator: one that is
-// divided by the frequency). maxIterations not above 0 means 100.
+// The bands have edges[2 b] and edges[2 b + 1], in the unit of fs, a gain (of a differentiator: a
+// slope in cycles per sample) and a weight (of a differentiator: one that is divided by the
+// frequency).
+struct RemezBands {
+    ConstRealVector desired, weight, edges;
+    double fs;
+    RemezType type;
+
+    std::ptrdiff_t count() const { return desired.size(); }
+    double lower(std::ptrdiff_t band) const { return edges[2 * band] / fs; }
+    double upper(std::ptrdiff_t band) const { return edges[2 * band + 1] / fs; }
+    double firstEdge() const { return edges[0]; }
+    double lastEdge() const { return edges[edges.size() - 1]; }
+};
+
+// The n taps of h, symmetric for a multiband filter, antisymmetric for the others; the deviation
+// into *ripple. maxIterations not above 0 means 100.
 //
 // ErrBadDesignField: n below 3; a number that is not finite; edges that do not begin or end where
 // the type needs it; a weight that vanishes with the factor of the symmetry; or an exchange that
@@ -28,9 +41,7 @@ enum RemezType : int32_t { RemezMultiband = 1, RemezDifferentiator = 2, RemezHil
 // edge or gain, edges that do not rise. ErrAboveNyquist. ErrBadTapCount: an even n with a gain at
 // the Nyquist frequency. ErrOutOfMemory: no memory, or about 4090 taps and more, the limit of the
 // design.
-ErrorCode RemezDesign(int32_t nBands, const DBL *desired, const DBL *weight, double fs,
-                      const DBL *edges, int32_t type, int32_t n, DBL *h, double *ripple,
-                      int32_t maxIterations);
+ErrorCode RemezDesign(const RemezBands &bands, RealVector h, double *ripple, int32_t maxIterations);
 
 // The interpolating polynomial of an exchange: through y[j] at x[j], with ad[j] = 1 / (product of
 // x[j] - x[k] over the other k).

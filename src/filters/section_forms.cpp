@@ -10,21 +10,23 @@ namespace qx {
 
 namespace {
 
-bool Fits(const CascadeCoefficients &from, const CascadeOutput &to, int32_t a, int32_t b) {
-    const int32_t order = SectionOrder(from.form), sections = from.aCount / order;
-    return from.aCount == order * sections && from.bCount == (order + 1) * sections &&
-           to.aCount >= a && to.bCount >= b;
+bool Fits(const CascadeCoefficients &from, const CascadeOutput &to, std::ptrdiff_t a,
+          std::ptrdiff_t b) {
+    const std::ptrdiff_t order = SectionOrder(from.form), sections = from.a.size() / order;
+    return from.a.size() == order * sections && from.b.size() == (order + 1) * sections &&
+           to.a.size() >= a && to.b.size() >= b;
 }
 
 // (1, a[0], a[1]) (1, a[2], a[3]) and (b[0], b[1], b[2]) (b[3], b[4], b[5]).
 ErrorCode MultiplyOut(const DBL *a, const DBL *b, DBL *fourthA, DBL *fourthB) {
     const double first[3] = {1.0, a[0], a[1]}, second[3] = {1.0, a[2], a[3]};
     double product[5];
-    if (const ErrorCode failed = ConvolveReal(first, 3, second, 3, ConvolveDirectly, product))
+    if (const ErrorCode failed =
+            ConvolveReal({first, 3}, {second, 3}, ConvolveDirectly, {product, 5}))
         return failed;
     for (int k = 0; k < 4; ++k)
         fourthA[k] = product[k + 1];
-    return ConvolveReal(b, 3, b + 3, 3, ConvolveDirectly, fourthB);
+    return ConvolveReal({b, 3}, {b + 3, 3}, ConvolveDirectly, {fourthB, 5});
 }
 
 // A polynomial of degree 4 as a multiple of two factors modulus2 - 2 re x + x^2, each with a pair
@@ -140,11 +142,11 @@ ErrorCode SplitNumerator(const DBL *b, DBL *second) {
 } // namespace
 
 ErrorCode SecondToFourthOrder(const CascadeCoefficients &second, const CascadeOutput &fourth) {
-    const int32_t sections = second.aCount / 2, pairs = (sections + 1) >> 1;
+    const std::ptrdiff_t sections = second.a.size() / 2, pairs = (sections + 1) >> 1;
     if (!Fits(second, fourth, 4 * pairs, 5 * pairs))
         return ErrCoefficientSizes;
-    const DBL *a = second.a, *b = second.b;
-    DBL *toA = fourth.a, *toB = fourth.b;
+    const DBL *a = second.a.data(), *b = second.b.data();
+    DBL *toA = fourth.a.data(), *toB = fourth.b.data();
     if (sections % 2 != 0) {
         for (int k = 0; k < 4; ++k)
             toA[k] = k < 2 ? +a[k] : 0.0;
@@ -152,20 +154,20 @@ ErrorCode SecondToFourthOrder(const CascadeCoefficients &second, const CascadeOu
             toB[k] = k < 3 ? +b[k] : 0.0;
         a += 2, b += 3, toA += 4, toB += 5;
     }
-    for (int32_t pair = 0; pair < sections / 2; ++pair, a += 4, b += 6, toA += 4, toB += 5)
+    for (std::ptrdiff_t pair = 0; pair < sections / 2; ++pair, a += 4, b += 6, toA += 4, toB += 5)
         if (const ErrorCode failed = MultiplyOut(a, b, toA, toB))
             return failed;
     return 0;
 }
 
 ErrorCode FourthToSecondOrder(const CascadeCoefficients &fourth, const CascadeOutput &second) {
-    const int32_t sections = fourth.aCount / 4;
+    const std::ptrdiff_t sections = fourth.a.size() / 4;
     if (!Fits(fourth, second, 4 * sections, 6 * sections))
         return ErrCoefficientSizes;
     for (std::ptrdiff_t s = 0; s < sections; ++s) {
-        if (const ErrorCode failed = SplitDenominator(fourth.a + 4 * s, second.a + 4 * s))
+        if (const ErrorCode failed = SplitDenominator(&fourth.a[4 * s], &second.a[4 * s]))
             return failed;
-        if (const ErrorCode failed = SplitNumerator(fourth.b + 5 * s, second.b + 6 * s))
+        if (const ErrorCode failed = SplitNumerator(&fourth.b[5 * s], &second.b[6 * s]))
             return failed;
     }
     return 0;

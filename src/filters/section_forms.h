@@ -6,16 +6,13 @@
 namespace qx {
 
 struct CascadeOutput {
-    DBL *a;
-    int32_t aCount;
-    DBL *b;
-    int32_t bCount;
+    RealVector a, b;
 };
 
 // The same filter in sections of the other order. ErrCoefficientSizes where the sizes do not fit;
 // ErrOutOfMemory.
 
-// Two sections are multiplied out to one; of an odd number the first stands alone, with zeros in
+// Two sections are multiplied out to one; of an odd number the first remains alone, with zeros in
 // the upper places.
 ErrorCode SecondToFourthOrder(const CascadeCoefficients &second, const CascadeOutput &fourth);
 

@@ -11,27 +11,28 @@
 namespace qx {
 namespace {
 
-// The two passes over a padded copy; pass(values, count, state) filters in place.
+// The two passes over a padded copy; pass(values, state) filters in place.
 template <class State, class Pass>
-ErrorCode ThereAndBack(DBL *x, int32_t n, int64_t pad, State forward, State backward, Pass pass) {
-    const int64_t count = n + 2 * pad;
+ErrorCode ThereAndBack(RealVector x, int64_t pad, State forward, State backward, Pass pass) {
+    const int64_t count = x.size() + 2 * pad;
     Scratch<ElementType::DBL> memory;
     if (count > std::numeric_limits<int32_t>::max())
         return ErrOutOfMemory;
     if (const ErrorCode failed = memory.allocate(count))
         return failed;
-    DBL *const padded = memory.data();
-    DBL *const middle = padded + pad;
-    const std::size_t size = sizeof(DBL) * static_cast<std::size_t>(n);
-    Fill(padded, static_cast<std::ptrdiff_t>(pad), 0.0);
-    std::memcpy(middle, x, size);
-    Fill(middle + n, static_cast<std::ptrdiff_t>(pad), 0.0);
+    const auto zeros = static_cast<std::ptrdiff_t>(pad);
+    const RealVector padded(memory.data(), static_cast<std::ptrdiff_t>(count));
+    DBL *const middle = padded.data() + zeros;
+    const std::size_t size = sizeof(DBL) * static_cast<std::size_t>(x.size());
+    Fill(padded.data(), zeros, 0.0);
+    std::memcpy(middle, x.data(), size);
+    Fill(middle + x.size(), zeros, 0.0);
     for (const State state : {forward, backward}) {
-        if (const ErrorCode failed = pass(padded, static_cast<int32_t>(count), state))
+        if (const ErrorCode failed = pass(padded, state))
             return failed;
-        Reverse(padded, static_cast<std::ptrdiff_t>(count));
+        Reverse(padded.data(), padded.size());
     }
-    std::memcpy(x, middle, size);
+    std::memcpy(x.data(), middle, size);
     return memory.release();
 }
 
@@ -47,36 +48,32 @@ int64_t ResponseLength(const DBL *coefficients, int32_t order, int64_t base) {
 
 } // namespace
 
-ErrorCode ZeroPhaseDirect(const DBL *a, int32_t na, const DBL *b, int32_t nb,
-                          DirectPassState forward, DirectPassState backward, DBL *x, int32_t n) {
+ErrorCode ZeroPhaseDirect(ConstRealVector a, ConstRealVector b, DirectPassState forward,
+                          DirectPassState backward, RealVector x) {
     typedef DirectForm<ElementType::DBL, ElementType::DBL> Filter;
-    return ThereAndBack(x, n, std::max(na, nb), forward, backward,
-                        [=](DBL *values, int32_t count, DirectPassState state) {
-                            return na < 1 ? Filter::fir(b, nb, values, count, state.x, values)
-                                          : Filter::iir(b, nb, state.x, a, na, state.y, values,
-                                                        count, values);
+    return ThereAndBack(x, std::max(a.size(), b.size()), forward, backward,
+                        [=](RealVector values, DirectPassState state) {
+                            return a.isEmpty()
+                                       ? Filter::fir(b, values, state.x, values)
+                                       : Filter::iir(b, state.x, a, state.y, values, values);
                         });
 }
 
-ErrorCode ZeroPhaseCascade(const CascadeCoefficients &filter, DBL *forward, DBL *backward, DBL *x,
-                           int32_t n) {
+ErrorCode ZeroPhaseCascade(const CascadeCoefficients &filter, RealVector forward,
+                           RealVector backward, RealVector x) {
     const int32_t order = SectionOrder(filter.form);
     if (order == 0)
         return ErrInvalidSelector;
-    if (filter.aCount < order || filter.bCount < order + 1)
+    if (filter.a.size() < order || filter.b.size() < order + 1)
         return ErrCoefficientSizes;
     // By the upper coefficients of the first section.
-    const int64_t base = int64_t{filter.aCount} / order * order - order / 2;
-    const int64_t pad = std::max(ResponseLength(filter.a + (order - 1), order, base),
-                                 ResponseLength(filter.b + order, order, base)) +
+    const int64_t base = int64_t{filter.a.size()} / order * order - order / 2;
+    const int64_t pad = std::max(ResponseLength(filter.a.data() + (order - 1), order, base),
+                                 ResponseLength(filter.b.data() + order, order, base)) +
                         1;
-    struct State {
-        DBL *values;
-    };
-    return ThereAndBack(
-        x, n, pad, State{forward}, State{backward}, [&](DBL *values, int32_t count, State state) {
-            return FilterIIRCascade(filter, state.values, filter.aCount, values, count);
-        });
+    return ThereAndBack(x, pad, forward, backward, [&](RealVector values, RealVector state) {
+        return FilterIIRCascade(filter, state, values);
+    });
 }
 
 } // namespace qx

@@ -2,10 +2,7 @@
 #define QX_FILTERS_ZERO_PHASE_H
 
 #include "filters/cascade.h"
-#include "frame/elements.h"
 #include "qx/errors.h"
-
-#include <cstdint>
 
 namespace qx {
 
@@ -14,16 +11,16 @@ namespace qx {
 // states of its own, which go through the zeros as well. A failure leaves x as it is.
 
 struct DirectPassState {
-    DBL *x, *y;
+    RealVector x, y;
 };
-// Without a denominator (na of 0) an FIR filter. ErrOutOfMemory.
-ErrorCode ZeroPhaseDirect(const DBL *a, int32_t na, const DBL *b, int32_t nb,
-                          DirectPassState forward, DirectPassState backward, DBL *x, int32_t n);
+// Without a denominator (an empty a) an FIR filter. ErrOutOfMemory.
+ErrorCode ZeroPhaseDirect(ConstRealVector a, ConstRealVector b, DirectPassState forward,
+                          DirectPassState backward, RealVector x);
 
 // Both states have the size of `a`. ErrInvalidSelector (no such form), ErrCoefficientSizes,
 // ErrOutOfMemory.
-ErrorCode ZeroPhaseCascade(const CascadeCoefficients &filter, DBL *forward, DBL *backward, DBL *x,
-                           int32_t n);
+ErrorCode ZeroPhaseCascade(const CascadeCoefficients &filter, RealVector forward,
+                           RealVector backward, RealVector x);
 
 } // namespace qx
 

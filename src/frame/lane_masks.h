@@ -8,7 +8,8 @@
 
 namespace qx {
 
-// Comparisons of lanes, choices by them, and the bits of numbers, for Lanes<2> and Lanes<4>.
+// Comparisons of lanes, choices by them, the bits of numbers, and lanes moved by one, for Lanes<2>
+// and Lanes<4>.
 
 template <int N>
 struct LaneInteger;
@@ -95,6 +96,15 @@ QX_INLINE bool Any(LaneMask<L> a) {
     else
         return (a.m[0] | a.m[1] | a.m[2] | a.m[3]) != 0;
 #endif
+}
+
+// The lanes moved up by one, with the last lane of `before` in the first.
+template <int N>
+QX_INLINE Lanes<N> MovedUp(Lanes<N> before, Lanes<N> value) {
+    if constexpr (N == 2)
+        return Lanes<N>(__builtin_shufflevector(before.v, value.v, 1, 2));
+    else
+        return Lanes<N>(__builtin_shufflevector(before.v, value.v, 3, 4, 5, 6));
 }
 
 } // namespace qx

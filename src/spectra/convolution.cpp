@@ -16,15 +16,19 @@ namespace {
 constexpr auto Real = ElementType::DBL;
 constexpr auto Complex = ElementType::CDB;
 
-const CDB *Elements(const DBL *interleaved) { return reinterpret_cast<const CDB *>(interleaved); }
-CDB *Elements(DBL *interleaved) { return reinterpret_cast<CDB *>(interleaved); }
+template <ElementType E>
+void CopyPadded(ConstVectorView<E> from, VectorView<E> to) {
+    const auto count = static_cast<std::size_t>(from.size());
+    const auto length = static_cast<std::size_t>(to.size());
+    std::memcpy(to.data(), from.data(), sizeof(typename VectorView<E>::T) * count);
+    std::memset(static_cast<void *>(to.data() + from.size()), 0,
+                sizeof(typename VectorView<E>::T) * (length - count));
+}
 
-template <ElementType Code>
-void CopyPadded(const typename Element<Code>::type *from, std::ptrdiff_t count,
-                typename Element<Code>::type *to, std::ptrdiff_t length) {
-    std::memcpy(to, from, sizeof *to * static_cast<std::size_t>(count));
-    std::memset(static_cast<void *>(to + count), 0,
-                sizeof *to * static_cast<std::size_t>(length - count));
+template <ElementType E>
+void CopyFirst(VectorView<E> from, VectorView<E> to) {
+    std::memcpy(to.data(), from.data(),
+                sizeof(typename VectorView<E>::T) * static_cast<std::size_t>(to.size()));
 }
 
 // out[t] = sum of a[i] b[t - i]. The shorter sequence are the taps; the steps let their order be
@@ -33,13 +37,13 @@ enum class Order { AscendingInA, DescendingInA };
 
 template <ElementType Code>
 void ConvolveSliding(ConstantSteps<Code> a, int32_t na, ConstantSteps<Code> b, int32_t nb,
-                     Order order, typename Element<Code>::type *out) {
+                     Order order, VectorView<Code> out) {
     const auto last = [](ConstantSteps<Code> s, int32_t n) {
         return ConstantSteps<Code>{s.at + (n - 1) * s.step, -s.step};
     };
     const int32_t count = na + nb - 1;
-    const Steps<Code> forward = {out, 1};
-    const Steps<Code> backward = {out + (count - 1), -1};
+    const Steps<Code> forward = {out.data(), 1};
+    const Steps<Code> backward = {out.data() + (count - 1), -1};
     const bool tapsAreA = na < nb;
     const int32_t taps = tapsAreA ? na : nb;
     const int32_t length = tapsAreA ? nb : na;
@@ -52,89 +56,85 @@ void ConvolveSliding(ConstantSteps<Code> a, int32_t na, ConstantSteps<Code> b, i
                  length, 1 - int64_t{taps}, rising ? forward : backward, count});
 }
 
-// The steps from two padded sequences of L values in `first` and `second` to the transform of
-// their convolution, which is left in `first`; `work` has L values as well.
-ErrorCode ConvolveCircularly(const FFTPlan *plan, int32_t L, DBL *first, DBL *second, DBL *work) {
-    if (const ErrorCode failed = FFTRealForward(plan, first, work, 1, 1, L))
+// From two padded sequences in `first` and `second` to the transform of their convolution, which is
+// left in `first`; all three have the same length.
+ErrorCode ConvolveCircularly(const FFTPlan *plan, RealVector first, RealVector second,
+                             RealVector work) {
+    const auto L = static_cast<int32_t>(first.size());
+    if (const ErrorCode failed = FFTRealForward(plan, first.data(), work.data(), 1, 1, L))
         return failed;
-    if (const ErrorCode failed = FFTRealForward(plan, second, first, 1, 1, L))
+    if (const ErrorCode failed = FFTRealForward(plan, second.data(), first.data(), 1, 1, L))
         return failed;
-    MultiplyHalfComplex(work, first, L, second);
-    return FFTRealInverse(plan, second, first, 1, 1, L);
+    MultiplyHalfComplex(work.data(), first.data(), L, second.data());
+    return FFTRealInverse(plan, second.data(), first.data(), 1, 1, L);
 }
 
 // The convolution of x, reversed if so asked, and y.
-ErrorCode TransformReal(const DBL *x, int32_t nx, bool reversed, const DBL *y, int32_t ny,
-                        DBL *out) {
-    const int32_t count = nx + ny - 1;
-    const int32_t L = NextTransformLength(count);
-    Scratch<Real> memory;
-    if (const ErrorCode failed = memory.allocate(3 * int64_t{L}))
+ErrorCode TransformReal(ConstRealVector x, bool reversed, ConstRealVector y, RealVector out) {
+    const int32_t L = NextTransformLength(static_cast<int32_t>(out.size()));
+    RealVector a, b, work;
+    ScratchParts memory;
+    if (const ErrorCode failed = memory.take(Sized(a, L), Sized(b, L), Sized(work, L)))
         return failed;
     const PlanReference plan(L);
     if (!plan)
         return ErrOutOfMemory;
-    DBL *const a = memory.data();
-    DBL *const b = a + L;
-    CopyPadded<Real>(x, nx, a, L);
+    CopyPadded(x, a);
     if (reversed)
-        Reverse(a, nx);
-    CopyPadded<Real>(y, ny, b, L);
-    if (const ErrorCode failed = ConvolveCircularly(plan.get(), L, a, b, b + L))
+        Reverse(a.data(), x.size());
+    CopyPadded(y, b);
+    if (const ErrorCode failed = ConvolveCircularly(plan.get(), a, b, work))
         return failed;
-    std::memcpy(out, a, sizeof(DBL) * static_cast<std::size_t>(count));
+    CopyFirst(a, out);
     return memory.release();
 }
 
-ErrorCode TransformComplex(const DBL *x, int32_t nx, const DBL *y, int32_t ny, DBL *out) {
-    const int32_t count = nx + ny - 1;
-    const int32_t L = NextTransformLength(count);
-    Scratch<Complex> memory;
-    if (const ErrorCode failed = memory.allocate(3 * int64_t{L}))
+ErrorCode TransformComplex(ConstComplexVector x, ConstComplexVector y, ComplexVector out) {
+    const int32_t L = NextTransformLength(static_cast<int32_t>(out.size()));
+    ComplexVector a, b, c;
+    ScratchParts memory;
+    if (const ErrorCode failed = memory.take(Sized(a, L), Sized(b, L), Sized(c, L)))
         return failed;
     const PlanReference plan(L);
     if (!plan)
         return ErrOutOfMemory;
-    CDB *const a = memory.data();
-    CDB *const b = a + L;
-    CDB *const c = b + L;
-    const auto forward = [&](const CDB *from, CDB *to) {
-        return FFTComplexForward(plan.get(), &from->re, &from->im, &to->re, &to->im, 2, 2, L);
+    const auto forward = [&](ComplexVector from, ComplexVector to) {
+        return FFTComplexForward(plan.get(), &from.data()->re, &from.data()->im, &to.data()->re,
+                                 &to.data()->im, 2, 2, L);
     };
-    CopyPadded<Complex>(Elements(x), nx, b, L);
-    CopyPadded<Complex>(Elements(y), ny, c, L);
+    CopyPadded(x, b);
+    CopyPadded(y, c);
     if (const ErrorCode failed = forward(b, a))
         return failed;
     if (const ErrorCode failed = forward(c, b))
         return failed;
-    MultiplyComplex(a, b, L, c);
-    if (const ErrorCode failed =
-            FFTComplexInverse(plan.get(), &c->re, &c->im, &a->re, &a->im, 2, 2, L))
+    MultiplyComplex(a.data(), b.data(), L, c.data());
+    if (const ErrorCode failed = FFTComplexInverse(plan.get(), &c.data()->re, &c.data()->im,
+                                                   &a.data()->re, &a.data()->im, 2, 2, L))
         return failed;
-    std::memcpy(out, a, sizeof(CDB) * static_cast<std::size_t>(count));
+    CopyFirst(a, out);
     return memory.release();
 }
 
 // By the squared magnitude of one spectrum; the circular result is laid out around lag zero.
-ErrorCode AutoCorrelateByTransform(const DBL *x, int32_t n, DBL *out) {
-    const int32_t L = NextTransformLength(2 * n - 1);
-    Scratch<Real> memory;
-    if (const ErrorCode failed = memory.allocate(2 * int64_t{L}))
+ErrorCode AutoCorrelateByTransform(ConstRealVector x, RealVector out) {
+    const int32_t L = NextTransformLength(static_cast<int32_t>(out.size()));
+    RealVector a, b;
+    ScratchParts memory;
+    if (const ErrorCode failed = memory.take(Sized(a, L), Sized(b, L)))
         return failed;
     const PlanReference plan(L);
     if (!plan)
         return ErrOutOfMemory;
-    DBL *const a = memory.data();
-    DBL *const b = a + L;
-    CopyPadded<Real>(x, n, a, L);
-    if (const ErrorCode failed = FFTRealForward(plan.get(), a, b, 1, 1, L))
+    CopyPadded(x, a);
+    if (const ErrorCode failed = FFTRealForward(plan.get(), a.data(), b.data(), 1, 1, L))
         return failed;
-    SquareHalfComplex(b, L, a);
-    if (const ErrorCode failed = FFTRealInverse(plan.get(), a, b, 1, 1, L))
+    SquareHalfComplex(b.data(), L, a.data());
+    if (const ErrorCode failed = FFTRealInverse(plan.get(), a.data(), b.data(), 1, 1, L))
         return failed;
-    const auto size = sizeof(DBL) * static_cast<std::size_t>(n);
-    std::memcpy(out + (n - 1), b, size);
-    std::memcpy(out, b + (L - n + 1), size - sizeof(DBL));
+    const std::ptrdiff_t n = x.size();
+    CopyFirst(b, out.part(n - 1, n));
+    CopyFirst(b.part(L - n + 1, n - 1), out.part(0, n - 1));
     return memory.release();
 }
 
@@ -144,34 +144,34 @@ void Divide(CDB *value, double divisor) {
     value->im = value->im / divisor;
 }
 
-template <ElementType Code>
-ErrorCode Normalize(typename Element<Code>::type *out, int32_t nx, int32_t ny,
+template <ElementType E>
+ErrorCode Normalize(VectorView<E> out, std::ptrdiff_t nx, std::ptrdiff_t ny,
                     int32_t normalization) {
-    const int32_t m = std::min(nx, ny);
-    const int32_t M = std::max(nx, ny);
-    const std::ptrdiff_t count = std::ptrdiff_t{m} + M - 1;
+    const std::ptrdiff_t m = std::min(nx, ny), count = out.size();
     switch (normalization) {
     case NotNormalized:
         return 0;
     case Unbiased:
         for (std::ptrdiff_t i = 0; i < count; ++i)
-            Divide(out + i, static_cast<double>(std::min({i + 1, count - i, std::ptrdiff_t{m}})));
+            Divide(&out[i], static_cast<double>(std::min({i + 1, count - i, m})));
         return 0;
     case Biased:
-        for (std::ptrdiff_t i = 0; i < count; ++i)
-            Divide(out + i, M);
+        for (auto &value : out)
+            Divide(&value, static_cast<double>(std::max(nx, ny)));
         return 0;
     default:
         return ErrInvalidSelector;
     }
 }
 
-// Empty or too long together for an output array.
-ErrorCode CheckLengths(int32_t nx, int32_t ny) {
-    if (nx < 1 || ny < 1)
-        return ErrEmptyInput;
-    return int64_t{nx} + ny - 1 > std::numeric_limits<int32_t>::max() ? ErrOutOfMemory : 0;
+template <ElementType E>
+[[maybe_unused]] bool HasSizeOfConvolution(VectorView<E> out, ConstVectorView<E> x,
+                                           ConstVectorView<E> y) {
+    return !x.isEmpty() && !y.isEmpty() && out.size() == x.size() + y.size() - 1 &&
+           out.size() <= std::numeric_limits<int32_t>::max();
 }
+
+int32_t Length(std::ptrdiff_t size) { return static_cast<int32_t>(size); }
 
 } // namespace
 
@@ -187,57 +187,54 @@ int32_t NextTransformLength(int32_t n) {
     return 0;
 }
 
-ErrorCode ConvolveReal(const DBL *x, int32_t nx, const DBL *y, int32_t ny, int32_t algorithm,
-                       DBL *out) {
-    if (const ErrorCode failed = CheckLengths(nx, ny))
-        return failed;
+ErrorCode ConvolveReal(ConstRealVector x, ConstRealVector y, int32_t algorithm, RealVector out) {
+    QX_EXPECTS(HasSizeOfConvolution(out, x, y));
     if (algorithm == ConvolveByTransform)
-        return TransformReal(x, nx, false, y, ny, out);
+        return TransformReal(x, false, y, out);
     if (algorithm == ConvolveDirectly)
-        ConvolveSliding<Real>({x}, nx, {y}, ny, Order::AscendingInA, out);
+        ConvolveSliding<Real>({x.data()}, Length(x.size()), {y.data()}, Length(y.size()),
+                              Order::AscendingInA, out);
     return 0;
 }
 
-ErrorCode ConvolveComplex(const DBL *x, int32_t nx, const DBL *y, int32_t ny, DBL *out,
-                          int32_t algorithm) {
-    if (const ErrorCode failed = CheckLengths(nx, ny))
-        return failed;
+ErrorCode ConvolveComplex(ConstComplexVector x, ConstComplexVector y, int32_t algorithm,
+                          ComplexVector out) {
+    QX_EXPECTS(HasSizeOfConvolution(out, x, y));
     if (algorithm == ConvolveByTransform)
-        return TransformComplex(x, nx, y, ny, out);
+        return TransformComplex(x, y, out);
     if (algorithm != ConvolveDirectly)
         return ErrInvalidSelector;
-    const Order order = nx > ny ? Order::AscendingInA : Order::DescendingInA;
-    ConvolveSliding<Complex>({Elements(x)}, nx, {Elements(y)}, ny, order, Elements(out));
+    const Order order = x.size() > y.size() ? Order::AscendingInA : Order::DescendingInA;
+    ConvolveSliding<Complex>({x.data()}, Length(x.size()), {y.data()}, Length(y.size()), order,
+                             out);
     return 0;
 }
 
-ErrorCode CorrelateReal(const DBL *x, int32_t nx, const DBL *y, int32_t ny, int32_t algorithm,
-                        DBL *out, int32_t normalization) {
-    if (const ErrorCode failed = CheckLengths(nx, ny))
-        return failed;
+ErrorCode CorrelateReal(ConstRealVector x, ConstRealVector y, int32_t algorithm,
+                        int32_t normalization, RealVector out) {
+    QX_EXPECTS(HasSizeOfConvolution(out, x, y));
     ErrorCode status = 0;
     if (algorithm == ConvolveDirectly)
-        ConvolveSliding<Real>({x + (nx - 1), -1}, nx, {y}, ny, Order::DescendingInA, out);
+        ConvolveSliding<Real>({x.end() - 1, -1}, Length(x.size()), {y.data()}, Length(y.size()),
+                              Order::DescendingInA, out);
     else if (algorithm == ConvolveByTransform)
-        status = x == y && nx == ny ? AutoCorrelateByTransform(x, nx, out)
-                                    : TransformReal(x, nx, true, y, ny, out);
-    return status != 0 ? status : Normalize<Real>(out, nx, ny, normalization);
+        status = x.data() == y.data() && x.size() == y.size() ? AutoCorrelateByTransform(x, out)
+                                                              : TransformReal(x, true, y, out);
+    return status != 0 ? status : Normalize(out, x.size(), y.size(), normalization);
 }
 
-ErrorCode CorrelateComplex(const DBL *x, int32_t nx, const DBL *y, int32_t ny, DBL *out,
-                           int32_t algorithm, int32_t normalization) {
-    if (const ErrorCode failed = CheckLengths(nx, ny))
-        return failed;
+ErrorCode CorrelateComplex(ConstComplexVector x, ConstComplexVector y, int32_t algorithm,
+                           int32_t normalization, ComplexVector out) {
     Scratch<Complex> reversed;
-    if (const ErrorCode failed = reversed.allocate(nx))
+    if (const ErrorCode failed = reversed.allocate(x.size()))
         return failed;
-    for (std::ptrdiff_t i = 0; i < nx; ++i) {
-        const CDB &from = Elements(x)[nx - 1 - i];
+    for (std::ptrdiff_t i = 0; i < x.size(); ++i) {
+        const CDB &from = x[x.size() - 1 - i];
         reversed[i] = {from.re, -from.im};
     }
-    ErrorCode status = ConvolveComplex(&reversed.data()->re, nx, y, ny, out, algorithm);
+    ErrorCode status = ConvolveComplex(ComplexVector(reversed.data(), x.size()), y, algorithm, out);
     status = Merge(status, reversed.release());
-    return status != 0 ? status : Normalize<Complex>(Elements(out), nx, ny, normalization);
+    return status != 0 ? status : Normalize(out, x.size(), y.size(), normalization);
 }
 
 } // namespace qx

@@ -1,30 +1,27 @@
 #ifndef QX_SPECTRA_CONVOLUTION_H
 #define QX_SPECTRA_CONVOLUTION_H
 
+#include "frame/views.h"
 #include "qx/errors.h"
-#include "qx/types.h"
 
 #include <cstdint>
 
 namespace qx {
 
 // Linear convolution, out[t] = sum over i of x[i] y[t - i], and correlation, which is the
-// convolution of x reversed (and conjugated) with y: element nx - 1 is lag zero. The output has nx
-// + ny - 1 values and overlaps no input; complex sequences are interleaved. The caller chooses the
-// algorithm; no size switches it.
+// convolution of x reversed (and conjugated) with y: element nx - 1 is lag zero. No input is empty;
+// the output has nx + ny - 1 values, which int32 holds, and overlaps no input. The caller chooses
+// the algorithm; no size switches it.
 //
 // Directly, the terms of each output are added to 0.0 in ascending order of i; complex ones in
-// ascending order of the index of the longer sequence (y if the lengths are equal).
-//
-// ErrEmptyInput for a length below 1; ErrOutOfMemory.
+// ascending order of the index of the longer sequence (y if the lengths are equal). ErrOutOfMemory.
 enum ConvolutionAlgorithm : int32_t { ConvolveDirectly = 0, ConvolveByTransform = 1 };
 
 // kept: any other algorithm is a success that leaves `out` as it is.
-ErrorCode ConvolveReal(const DBL *x, int32_t nx, const DBL *y, int32_t ny, int32_t algorithm,
-                       DBL *out);
+ErrorCode ConvolveReal(ConstRealVector x, ConstRealVector y, int32_t algorithm, RealVector out);
 // Any other algorithm: ErrInvalidSelector.
-ErrorCode ConvolveComplex(const DBL *x, int32_t nx, const DBL *y, int32_t ny, DBL *out,
-                          int32_t algorithm);
+ErrorCode ConvolveComplex(ConstComplexVector x, ConstComplexVector y, int32_t algorithm,
+                          ComplexVector out);
 
 // 1 divides each lag by the number of its terms, 2 all of them by the greater length. Anything
 // else: ErrInvalidSelector, with the correlation done.
@@ -32,11 +29,11 @@ enum CorrelationNormalization : int32_t { NotNormalized = 0, Unbiased = 1, Biase
 
 // Directly, the terms are added in ascending order of the index of y. By transforms, x and y at one
 // address are taken as an autocorrelation, which needs two transforms in place of three.
-// kept: another algorithm normalizes what stands in `out`.
-ErrorCode CorrelateReal(const DBL *x, int32_t nx, const DBL *y, int32_t ny, int32_t algorithm,
-                        DBL *out, int32_t normalization);
-ErrorCode CorrelateComplex(const DBL *x, int32_t nx, const DBL *y, int32_t ny, DBL *out,
-                           int32_t algorithm, int32_t normalization);
+// kept: another algorithm normalizes what is in `out`.
+ErrorCode CorrelateReal(ConstRealVector x, ConstRealVector y, int32_t algorithm,
+                        int32_t normalization, RealVector out);
+ErrorCode CorrelateComplex(ConstComplexVector x, ConstComplexVector y, int32_t algorithm,
+                           int32_t normalization, ComplexVector out);
 
 // The length of transforms for n values: the smallest m from n on all of whose prime factors are
 // among 2, 3, 5, 7, 11, 13, 17, 19, 29, 31, 37, 41, 43, those whose transforms are straight-line

@@ -13,11 +13,9 @@
 namespace qx {
 namespace {
 
-typedef Scratch<ElementType::DBL> Work;
-
-void CopyPadded(const DBL *from, std::ptrdiff_t count, DBL *to, std::ptrdiff_t length) {
-    std::memcpy(to, from, sizeof(DBL) * static_cast<std::size_t>(count));
-    Fill(to + count, length - count, 0.0);
+void CopyPadded(ConstRealVector from, RealVector to) {
+    std::memcpy(to.data(), from.data(), sizeof(DBL) * static_cast<std::size_t>(from.size()));
+    Fill(to.data() + from.size(), to.size() - from.size(), 0.0);
 }
 
 // Whether a value of the half-complex spectrum h is too small to divide by. NaN is not.
@@ -50,14 +48,14 @@ void DivideHalfComplex(DBL *g, const DBL *h, std::ptrdiff_t L) {
         g[L / 2] = g[L / 2] / h[L / 2];
 }
 
-// What the taps x give for a unit impulse, the `count` first values: x itself and zeros after it,
+// What the taps x give for a unit impulse, the first values: x itself and zeros after it,
 // but each sum also meets all the other taps times zero.
-void ImpulseResponse(const DBL *x, std::ptrdiff_t nx, DBL *response, std::ptrdiff_t count) {
+void ImpulseResponse(ConstRealVector x, RealVector response) {
     std::ptrdiff_t broken = 0;
-    for (std::ptrdiff_t i = 0; i < nx; ++i)
-        broken += !std::isfinite(x[i]);
-    for (std::ptrdiff_t t = 0; t < count; ++t) {
-        const double own = t < nx ? x[t] : 0.0;
+    for (const double value : x)
+        broken += !std::isfinite(value);
+    for (std::ptrdiff_t t = 0; t < response.size(); ++t) {
+        const double own = t < x.size() ? x[t] : 0.0;
         const std::ptrdiff_t others = broken - !std::isfinite(own);
         response[t] = others == 0 ? 0.0 + own : std::numeric_limits<double>::quiet_NaN();
     }
@@ -66,59 +64,55 @@ void ImpulseResponse(const DBL *x, std::ptrdiff_t nx, DBL *response, std::ptrdif
 // By the series: with i leading zeros in y, the quotient begins at place i of the response of the
 // filter with the numerator x and the denominator y from i on. An all-zero y leaves the numerator
 // alone, and the quotient begins at place ny.
-ErrorCode DivideSeries(const DBL *x, int32_t nx, const DBL *y, int32_t ny, DBL *out) {
-    int32_t i = 0;
-    while (i < ny && y[i] == 0.0)
-        ++i;
-    const int32_t na = ny - i;
-    const int32_t outCount = nx - ny + 1;
-    const int32_t count = outCount + i;
-    Work work;
-    if (const ErrorCode failed = work.allocate(int64_t{count} + na))
+ErrorCode DivideSeries(ConstRealVector x, ConstRealVector y, RealVector quotient) {
+    std::ptrdiff_t zeros = 0;
+    while (zeros < y.size() && y[zeros] == 0.0)
+        ++zeros;
+    const ConstRealVector divisor = y.part(zeros, y.size() - zeros);
+    RealVector response, history;
+    ScratchParts memory;
+    if (const ErrorCode failed =
+            memory.take(Sized(response, int64_t{quotient.size()} + zeros),
+                        Sized(history, std::max<std::ptrdiff_t>(0, divisor.size() - 1))))
         return failed;
-    DBL *const response = work.data();
-    ImpulseResponse(x, nx, response, count);
-    if (na > 0) {
-        DBL *const history = response + count;
-        Fill(history, na - 1, 0.0);
-        RunRecursion(y + i, na, history, response, count);
+    ImpulseResponse(x, response);
+    if (!divisor.isEmpty()) {
+        Fill(history.data(), history.size(), 0.0);
+        RunRecursion(divisor, history, response);
     }
-    std::memcpy(out, response + i, sizeof(DBL) * static_cast<std::size_t>(outCount));
-    return work.release();
+    std::memcpy(quotient.data(), response.data() + zeros,
+                sizeof(DBL) * static_cast<std::size_t>(quotient.size()));
+    return memory.release();
 }
 
 } // namespace
 
-ErrorCode DeconvolveReal(const DBL *x, int32_t nx, const DBL *y, int32_t ny, DBL *out) {
-    if (nx < 1 || ny < 1)
-        return ErrEmptyInput;
-    if (nx < ny)
-        return ErrSizesDisagree;
+ErrorCode DeconvolveReal(ConstRealVector x, ConstRealVector y, RealVector quotient) {
+    QX_EXPECTS(!y.isEmpty() && quotient.size() == x.size() - y.size() + 1);
     int64_t L = 1;
-    while (L < nx)
+    while (L < x.size())
         L *= 2;
-    Work memory;
-    if (const ErrorCode failed = memory.allocate(3 * L))
+    RealVector g, padded, h;
+    ScratchParts memory;
+    if (const ErrorCode failed = memory.take(Sized(g, L), Sized(padded, L), Sized(h, L)))
         return failed;
     const auto length = static_cast<int32_t>(L);
     const PlanReference plan(length);
     if (!plan)
         return ErrOutOfMemory;
-    DBL *const g = memory.data();
-    DBL *const padded = g + length;
-    DBL *const h = padded + length;
-    CopyPadded(y, ny, g, length);
-    if (const ErrorCode failed = FFTRealForward(plan.get(), g, h, 1, 1, length))
+    CopyPadded(y, g);
+    if (const ErrorCode failed = FFTRealForward(plan.get(), g.data(), h.data(), 1, 1, length))
         return failed;
-    if (IsSingular(h, length))
-        return DivideSeries(x, nx, y, ny, out);
-    CopyPadded(x, nx, padded, length);
-    if (const ErrorCode failed = FFTRealForward(plan.get(), padded, g, 1, 1, length))
+    if (IsSingular(h.data(), length))
+        return DivideSeries(x, y, quotient);
+    CopyPadded(x, padded);
+    if (const ErrorCode failed = FFTRealForward(plan.get(), padded.data(), g.data(), 1, 1, length))
         return failed;
-    DivideHalfComplex(g, h, length);
-    if (const ErrorCode failed = FFTRealInverse(plan.get(), g, padded, 1, 1, length))
+    DivideHalfComplex(g.data(), h.data(), length);
+    if (const ErrorCode failed = FFTRealInverse(plan.get(), g.data(), padded.data(), 1, 1, length))
         return failed;
-    std::memcpy(out, padded, sizeof(DBL) * static_cast<std::size_t>(nx - ny + 1));
+    std::memcpy(quotient.data(), padded.data(),
+                sizeof(DBL) * static_cast<std::size_t>(quotient.size()));
     return memory.release();
 }
 

@@ -30,11 +30,9 @@ bool IsOne(double a) { return a == 1.0; }
 bool IsOne(const CDB &) { return false; }
 
 template <bool Divides, ElementType Coefficient, ElementType Signal>
-void Run(const typename Element<Coefficient>::type *a, int32_t na,
-         const typename Element<Signal>::type *history, typename Element<Signal>::type *y,
-         int32_t n) {
-    const std::ptrdiff_t order = na - 1;
-    for (std::ptrdiff_t t = 0; t < n; ++t) {
+void Run(ConstVectorView<Coefficient> a, ConstVectorView<Signal> history, VectorView<Signal> y) {
+    const std::ptrdiff_t order = history.size();
+    for (std::ptrdiff_t t = 0; t < y.size(); ++t) {
         auto sum = y[t];
         std::ptrdiff_t k = order;
         for (; k > t; --k)
@@ -45,36 +43,27 @@ void Run(const typename Element<Coefficient>::type *a, int32_t na,
     }
 }
 
-template <ElementType Coefficient, ElementType Signal>
-void RunAndRemember(const typename Element<Coefficient>::type *a, int32_t na,
-                    typename Element<Signal>::type *history, typename Element<Signal>::type *y,
-                    int32_t n) {
-    if (IsOne(a[0]))
-        Run<false, Coefficient, Signal>(a, na, history, y, n);
-    else
-        Run<true, Coefficient, Signal>(a, na, history, y, n);
-    const std::ptrdiff_t order = na - 1;
-    const std::ptrdiff_t fresh = std::min<std::ptrdiff_t>(order, n);
-    constexpr std::size_t size = sizeof *y;
-    std::memmove(static_cast<void *>(history), history + fresh,
-                 size * static_cast<std::size_t>(order - fresh));
-    std::memcpy(static_cast<void *>(history + (order - fresh)), y + (n - fresh),
-                size * static_cast<std::size_t>(fresh));
-}
-
-constexpr auto Real = ElementType::DBL;
-constexpr auto Complex = ElementType::CDB;
-
 } // namespace
 
-void RunRecursion(const DBL *a, int32_t na, DBL *history, DBL *y, int32_t n) {
-    RunAndRemember<Real, Real>(a, na, history, y, n);
+template <ElementType Coefficient, ElementType Signal>
+void RunRecursion(ConstVectorView<Coefficient> a, VectorView<Signal> history,
+                  VectorView<Signal> y) {
+    QX_EXPECTS(a.size() > 0 && history.size() == a.size() - 1);
+    if (IsOne(a[0]))
+        Run<false, Coefficient, Signal>(a, history, y);
+    else
+        Run<true, Coefficient, Signal>(a, history, y);
+    const std::ptrdiff_t order = history.size();
+    const std::ptrdiff_t fresh = std::min(order, y.size());
+    constexpr std::size_t size = sizeof(typename VectorView<Signal>::T);
+    std::memmove(static_cast<void *>(history.data()), history.data() + fresh,
+                 size * static_cast<std::size_t>(order - fresh));
+    std::memcpy(static_cast<void *>(history.data() + (order - fresh)),
+                y.data() + (y.size() - fresh), size * static_cast<std::size_t>(fresh));
 }
-void RunRecursion(const CDB *a, int32_t na, CDB *history, CDB *y, int32_t n) {
-    RunAndRemember<Complex, Complex>(a, na, history, y, n);
-}
-void RunRecursion(const DBL *a, int32_t na, CDB *history, CDB *y, int32_t n) {
-    RunAndRemember<Real, Complex>(a, na, history, y, n);
-}
+
+template void RunRecursion(ConstRealVector a, RealVector history, RealVector y);
+template void RunRecursion(ConstComplexVector a, ComplexVector history, ComplexVector y);
+template void RunRecursion(ConstRealVector a, ComplexVector history, ComplexVector y);
 
 } // namespace qx

@@ -1,7 +1,7 @@
 #ifndef QX_SPECTRA_RECURSION_H
 #define QX_SPECTRA_RECURSION_H
 
-#include "frame/elements.h"
+#include "frame/views.h"
 
 #include <cmath>
 #include <cstdint>
@@ -22,10 +22,8 @@ inline double Flush(double value) {
 // in this order of subtraction. `history` holds the na - 1 values before y[0], the newest last, and
 // is brought up to date. A complex division multiplies by the conjugate of a[0] and divides by its
 // squared magnitude.
-void RunRecursion(const DBL *a, int32_t na, DBL *history, DBL *y, int32_t n);
-void RunRecursion(const CDB *a, int32_t na, CDB *history, CDB *y, int32_t n);
-// Real coefficients for complex values.
-void RunRecursion(const DBL *a, int32_t na, CDB *history, CDB *y, int32_t n);
+template <ElementType Coefficient, ElementType Signal>
+void RunRecursion(ConstVectorView<Coefficient> a, VectorView<Signal> history, VectorView<Signal> y);
 
 } // namespace qx
 

@@ -13,8 +13,6 @@
 namespace qx {
 namespace {
 
-typedef Scratch<ElementType::CDB> Work;
-
 constexpr CDB one = {1.0, 0.0};
 
 double Square(const CDB &z) { return z.re * z.re + z.im * z.im; }
@@ -58,23 +56,23 @@ ErrorCode CheckSpiral(const CDB &a, const CDB &w) {
 }
 
 // terms[k] = x[k] a^(-k), from one power and a product for each further value.
-template <ElementType Code>
-void TakeStart(const typename Element<Code>::type *x, std::ptrdiff_t n, const CDB &a, CDB *terms) {
-    CDB factor = Powers(a).of(static_cast<double>(1 - n));
-    for (std::ptrdiff_t k = n - 1; k >= 0; --k) {
+template <ElementType E>
+void TakeStart(ConstVectorView<E> x, const CDB &a, ComplexVector terms) {
+    CDB factor = Powers(a).of(static_cast<double>(1 - x.size()));
+    for (std::ptrdiff_t k = x.size() - 1; k >= 0; --k) {
         terms[k] = factor * x[k];
         factor = factor * a;
     }
 }
 
 // out[m] = sum over k of terms[k] w^(k m).
-void SumDirectly(const CDB *terms, std::ptrdiff_t n, const CDB &w, CDB *out, std::ptrdiff_t count) {
+void SumDirectly(ConstComplexVector terms, const CDB &w, ComplexVector out) {
     const Powers powers(w);
-    for (std::ptrdiff_t m = 0; m < count; ++m) {
+    for (std::ptrdiff_t m = 0; m < out.size(); ++m) {
         CDB sum = {0.0, 0.0};
         double exponent = 0;
-        for (std::ptrdiff_t k = 0; k < n; ++k) {
-            sum += terms[k] * powers.of(exponent);
+        for (const CDB &term : terms) {
+            sum += term * powers.of(exponent);
             exponent += static_cast<double>(m);
         }
         out[m] = sum;
@@ -82,45 +80,28 @@ void SumDirectly(const CDB *terms, std::ptrdiff_t n, const CDB &w, CDB *out, std
 }
 
 // By k m = (k^2 + m^2 - (m - k)^2) / 2 the sum is a convolution with a chirp.
-ErrorCode SumByConvolution(CDB *terms, int32_t n, const CDB &w, CDB *out, int32_t count) {
-    const int64_t chirpLength = int64_t{count} + n;
-    const int64_t length = chirpLength + n - 1;
+ErrorCode SumByConvolution(ComplexVector terms, const CDB &w, ComplexVector out) {
+    const std::ptrdiff_t n = terms.size();
+    const int64_t length = int64_t{out.size()} + 2 * n - 1;
     if (length > std::numeric_limits<int32_t>::max())
         return ErrOutOfMemory;
-    Work memory;
-    if (const ErrorCode failed = memory.allocate(chirpLength + length))
+    ComplexVector chirp, convolution;
+    ScratchParts memory;
+    if (const ErrorCode failed =
+            memory.take(Sized(chirp, int64_t{out.size()} + n), Sized(convolution, length)))
         return failed;
-    CDB *const chirp = memory.data();
-    CDB *const convolution = chirp + chirpLength;
     const Powers powers(w);
-    for (std::ptrdiff_t t = 0; t < chirpLength; ++t) {
+    for (std::ptrdiff_t t = 0; t < chirp.size(); ++t) {
         const auto i = static_cast<double>(t - n);
         chirp[t] = powers.of(-(i * i) * 0.5);
     }
     for (std::ptrdiff_t k = 0; k < n; ++k)
         terms[k] = terms[k] / chirp[n - k];
-    if (const ErrorCode failed =
-            ConvolveComplex(&terms->re, n, &chirp->re, static_cast<int32_t>(chirpLength),
-                            &convolution->re, ConvolveByTransform))
+    if (const ErrorCode failed = ConvolveComplex(terms, chirp, ConvolveByTransform, convolution))
         return failed;
-    for (std::ptrdiff_t m = 0; m < count; ++m)
+    for (std::ptrdiff_t m = 0; m < out.size(); ++m)
         out[m] = convolution[n + m] / chirp[n + m];
     return memory.release();
-}
-
-template <ElementType Code>
-ErrorCode Transform(const typename Element<Code>::type *x, int32_t n, const CDB &a, const CDB &w,
-                    uint32_t method, CDB *out, int32_t count) {
-    if (const ErrorCode failed = CheckSpiral(a, w))
-        return failed;
-    Work terms;
-    if (const ErrorCode failed = terms.allocate(n))
-        return failed;
-    TakeStart<Code>(x, n, a, terms.data());
-    if (method == Bluestein)
-        return SumByConvolution(terms.data(), n, w, out, count);
-    SumDirectly(terms.data(), n, w, out, count);
-    return terms.release();
 }
 
 // A number whose exponent may leave the range of double: on the full circle products of n
@@ -140,13 +121,11 @@ struct Scaled {
     }
 };
 
-// u[k], the product of 1 / (1 - w^(-j)) over j from 1 to k. The exponents stand apart.
+// u[k], the product of 1 / (1 - w^(-j)) over j from 1 to k. The exponents are kept apart.
 class Reciprocals {
 public:
     ErrorCode build(const Powers &w, std::ptrdiff_t n) {
-        if (const ErrorCode failed = values_.allocate(n))
-            return failed;
-        if (const ErrorCode failed = exponents_.allocate(n))
+        if (const ErrorCode failed = memory_.take(Sized(values_, n), Sized(exponents_, n)))
             return failed;
         Scaled u;
         for (std::ptrdiff_t k = 0; k < n; ++k) {
@@ -172,8 +151,9 @@ public:
     }
 
 private:
-    Work values_;
-    Scratch<ElementType::I32> exponents_;
+    ScratchParts memory_;
+    ComplexVector values_;
+    I32 *exponents_;
 };
 
 // (-1)^k w^(-k (k + step) / 2)
@@ -205,18 +185,21 @@ std::ptrdiff_t BestStretch(std::ptrdiff_t n, std::ptrdiff_t count, const CDB &w,
 }
 
 // The polynomial of n coefficients, y[0] first, that has the given values at the powers of w.
-// `work` has 3 n values beside the 2 n - 1 of y.
-ErrorCode Interpolate(const CDB *values, int32_t n, const CDB &w, CDB *work, CDB *y) {
+// y has 2 n - 1 values.
+ErrorCode Interpolate(ConstComplexVector values, const CDB &w, ComplexVector y) {
+    const std::ptrdiff_t n = values.size();
     const Powers powers(w);
     Reciprocals u;
     if (const ErrorCode failed = u.build(powers, n))
         return failed;
-    CDB *const weighted = work;
-    CDB *const sums = weighted + n;
-    CDB *const binomials = sums + n;
+    ComplexVector weighted, sums, binomials;
+    ScratchParts memory;
+    if (const ErrorCode failed =
+            memory.take(Sized(weighted, n), Sized(sums, n), Sized(binomials, n)))
+        return failed;
     for (std::ptrdiff_t m = 0; m < n; ++m)
         weighted[m] = values[m] * (AlternatingChirp(powers, m, 1) * u.pair(m, n - 1 - m).plain(0));
-    SumDirectly(weighted, n, one / w, sums, n);
+    SumDirectly(weighted, one / w, sums);
     const CDB last = powers.oneLess(static_cast<double>(-n));
     const Scaled whole = u[n - 1];
     binomials[0] = {1.0, 0.0};
@@ -224,31 +207,43 @@ ErrorCode Interpolate(const CDB *values, int32_t n, const CDB &w, CDB *work, CDB
         const Scaled quotient = u.pair(k, n - k).times(last / whole.value);
         binomials[k] = AlternatingChirp(powers, k, -1) * quotient.plain(-whole.exponent);
     }
-    return ConvolveComplex(&sums->re, n, &binomials->re, n, &y->re, ConvolveDirectly);
+    return ConvolveComplex(sums, binomials, ConvolveDirectly, y);
 }
 
 } // namespace
 
-ErrorCode ChirpZ(const DBL *x, int32_t n, CDB a, CDB w, uint32_t method, CDB *out, int32_t count) {
-    return Transform<ElementType::DBL>(x, n, a, w, method, out, count);
-}
-ErrorCode ChirpZ(const CDB *x, int32_t n, CDB a, CDB w, uint32_t method, CDB *out, int32_t count) {
-    return Transform<ElementType::CDB>(x, n, a, w, method, out, count);
-}
-
-ErrorCode InverseChirpZ(const CDB *in, int32_t n, CDB a, CDB w, CDB *out, int32_t count) {
+template <ElementType E>
+ErrorCode ChirpZ(ConstVectorView<E> x, CDB a, CDB w, ChirpMethod method, ComplexVector out) {
     if (const ErrorCode failed = CheckSpiral(a, w))
         return failed;
-    Work memory;
-    if (const ErrorCode failed = memory.allocate(5 * int64_t{count}))
+    ComplexVector terms;
+    ScratchParts memory;
+    if (const ErrorCode failed = memory.take(Sized(terms, x.size())))
+        return failed;
+    TakeStart(x, a, terms);
+    if (method == Bluestein)
+        return SumByConvolution(terms, w, out);
+    SumDirectly(terms, w, out);
+    return memory.release();
+}
+
+template ErrorCode ChirpZ(ConstRealVector, CDB, CDB, ChirpMethod, ComplexVector);
+template ErrorCode ChirpZ(ConstComplexVector, CDB, CDB, ChirpMethod, ComplexVector);
+
+ErrorCode InverseChirpZ(ConstComplexVector in, CDB a, CDB w, ComplexVector out) {
+    const std::ptrdiff_t n = in.size(), count = out.size();
+    QX_EXPECTS(count > 0 && count <= n);
+    if (const ErrorCode failed = CheckSpiral(a, w))
+        return failed;
+    ComplexVector y;
+    ScratchParts memory;
+    if (const ErrorCode failed = memory.take(Sized(y, 2 * int64_t{count} - 1)))
         return failed;
     CDB start = one / a;
     const std::ptrdiff_t first = count < n ? BestStretch(n, count, w, &start) : 0;
     if (Square(start) == 0.0)
         return ErrDegenerateValue;
-    CDB *const y = memory.data();
-    if (const ErrorCode failed =
-            Interpolate(in + first, count, w, y + 2 * std::ptrdiff_t{count}, y))
+    if (const ErrorCode failed = Interpolate(in.part(first, count), w, y))
         return failed;
     const Powers powers(start);
     for (std::ptrdiff_t k = 0; k < count; ++k)

@@ -1,15 +1,16 @@
 #ifndef QX_TRANSFORMS_CHIRP_Z_H
 #define QX_TRANSFORMS_CHIRP_Z_H
 
-#include "frame/elements.h"
+#include "frame/views.h"
 #include "qx/errors.h"
 
 #include <cstdint>
 
 namespace qx {
 
-// The z-transform of n values on a spiral of `count` points, X[m] = sum over k of x[k] a^(-k)
-// w^(k m). A power z^p is exp(i p arg z) times (|z|^2)^(p/2).
+// The z-transform of n values on a spiral of `count` points, the size of the output: X[m] = sum
+// over k of x[k] a^(-k) w^(k m). No input is empty. A power z^p is exp(i p arg z) times
+// (|z|^2)^(p/2).
 //
 // ErrNonFiniteInput (a), ErrTooFewWeights (a is 0), the same two of w, ErrOutOfMemory.
 enum ChirpMethod : uint32_t {
@@ -17,11 +18,12 @@ enum ChirpMethod : uint32_t {
     Bluestein = 1, // one convolution by transforms, n + count powers
 };
 
-ErrorCode ChirpZ(const DBL *x, int32_t n, CDB a, CDB w, uint32_t method, CDB *out, int32_t count);
-ErrorCode ChirpZ(const CDB *x, int32_t n, CDB a, CDB w, uint32_t method, CDB *out, int32_t count);
+template <ElementType E>
+ErrorCode ChirpZ(ConstVectorView<E> x, CDB a, CDB w, ChirpMethod method, ComplexVector out);
 
-// The inverse: the sequence of `count` values whose transform is the input. Of more input values a
-// stretch of `count` is taken, around the point of the spiral that is nearest to the unit circle.
+// The inverse: the sequence of `count` values whose transform is the input, which has as many
+// values or more. Of more input values a stretch of `count` is taken, around the point of the
+// spiral that is nearest to the unit circle.
 //
 // With y[k] = x[k] a^(-k) this is the interpolation of a polynomial at the powers of w, solved by
 // Lagrange's formula: the products of the differences of such points are products of 1 - w^(-j),
@@ -30,7 +32,7 @@ ErrorCode ChirpZ(const CDB *x, int32_t n, CDB a, CDB w, uint32_t method, CDB *ou
 // (docs/accuracy/chirp_z.md).
 //
 // Beside the above: ErrDegenerateValue where two points agree to rounding.
-ErrorCode InverseChirpZ(const CDB *in, int32_t n, CDB a, CDB w, CDB *out, int32_t count);
+ErrorCode InverseChirpZ(ConstComplexVector in, CDB a, CDB w, ComplexVector out);
 
 } // namespace qx
 

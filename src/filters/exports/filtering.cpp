@@ -62,16 +62,16 @@ Path CascadePath(bool hasA, bool hasB) {
 template <class Signal, class Coefficients>
 using Filter = DirectForm<HandleTraits<Coefficients>::code, HandleTraits<Signal>::code>;
 
+// A filter of the FIR path does not read its a and yState.
 template <class Signal, class Coefficients>
 ErrorCode RunDirect(Path path, const In<Coefficients> &a, const In<Coefficients> &b,
-                    typename Filter<Signal, Coefficients>::X *xState,
-                    typename Filter<Signal, Coefficients>::Y *yState,
-                    const typename Filter<Signal, Coefficients>::X *x, int32_t n,
-                    typename Filter<Signal, Coefficients>::Y *y) {
+                    VectorView<HandleTraits<Signal>::code> xState,
+                    VectorView<Filter<Signal, Coefficients>::output> yState,
+                    ConstVectorView<HandleTraits<Signal>::code> x,
+                    VectorView<Filter<Signal, Coefficients>::output> y) {
     typedef Filter<Signal, Coefficients> F;
-    if (path == Path::FIR)
-        return F::fir(b.data(), b.size(), x, n, xState, y);
-    return F::iir(b.data(), b.size(), xState, a.data(), a.size(), yState, x, n, y);
+    return path == Path::FIR ? F::fir(b.view(), x, xState, y)
+                             : F::iir(b.view(), xState, a.view(), yState, x, y);
 }
 
 // Where the second one is refused the first is cleared all the same.
@@ -104,8 +104,8 @@ Outcome FilterTwoStates(Kept<Signal> x, In<Coefficients> a, In<Coefficients> b, 
         return EmptiedOnFailure(x, ErrSizesDisagree);
     if (const Outcome bad = FitBoth(xState, b.size(), yState, a.size(), clears))
         return bad;
-    return EmptiedOnFailure(x, RunDirect<Signal>(path, a, b, xState.data(), yState.data(), x.data(),
-                                                 x.size(), x.data()));
+    return EmptiedOnFailure(
+        x, RunDirect<Signal>(path, a, b, xState.view(), yState.view(), x.view(), x.view()));
 }
 
 // A real signal through a complex filter.
@@ -125,13 +125,13 @@ Outcome FilterIntoComplex(In<DBL1D> x, Out<CDB1D> y, In<CDB1D> a, In<CDB1D> b, K
     }
     if (const Outcome bad = FitBoth(xState, b.size(), yState, a.size(), clears))
         return bad;
-    return RunDirect<DBL1D>(path, a, b, xState.data(), yState.data(), x.data(), x.size(), y.data());
+    return RunDirect<DBL1D>(path, a, b, xState.view(), yState.view(), x.view(), y.view());
 }
 
 // The state of x and that of y in one array.
-template <class Signal, class State>
-Outcome RunJoined(Path path, const In<DBL1D> &a, const In<DBL1D> &b, State &state, bool clears,
-                  typename State::T *x, int32_t n) {
+template <class Signal>
+Outcome RunJoined(Path path, const In<DBL1D> &a, const In<DBL1D> &b, InOut<Signal> &state,
+                  bool clears, VectorView<HandleTraits<Signal>::code> x) {
     const int32_t ofX = Memory(b.size());
     const int32_t ofY = path == Path::IIR ? Memory(a.size()) : 0;
     if (ofX > std::numeric_limits<int32_t>::max() - ofY)
@@ -140,7 +140,8 @@ Outcome RunJoined(Path path, const In<DBL1D> &a, const In<DBL1D> &b, State &stat
         return bad;
     if (clears)
         Clear(state);
-    return RunDirect<Signal>(path, a, b, state.data(), state.data() + ofX, x, n, x);
+    const auto values = state.view();
+    return RunDirect<Signal>(path, a, b, values.part(0, ofX), values.part(ofX, ofY), x, x);
 }
 
 template <class Signal>
@@ -153,19 +154,18 @@ Outcome FilterOneState(InOut<Signal> x, In<DBL1D> a, In<DBL1D> b, InOut<Signal> 
         return 0;
     if (path == Path::Missing)
         return ErrSizesDisagree;
-    return RunJoined<Signal>(path, a, b, state, clears, x.data(), x.size());
+    return RunJoined<Signal>(path, a, b, state, clears, x.view());
 }
 
-template <class State>
+template <ElementType E, class State>
 Outcome RunCascade(int32_t form, const In<DBL1D> &a, const In<DBL1D> &b, State &state, bool clears,
-                   typename State::T *x, int32_t n) {
+                   VectorView<E> x) {
     const int32_t order = SectionOrder(form);
     if (const Outcome bad = Fit(state, a.size() / order * order, clears))
         return bad;
     if (clears)
         Clear(state);
-    return FilterIIRCascade({a.data(), a.size(), b.data(), b.size(), form}, state.data(),
-                            state.size(), x, n);
+    return FilterIIRCascade<E>({a.view(), b.view(), form}, state.view(), x);
 }
 
 template <class Signal>
@@ -181,15 +181,16 @@ Outcome FilterCascade(Kept<Signal> x, int32_t form, In<DBL1D> a, In<DBL1D> b, Ke
     // kept: unlike the other codes this one leaves x as it is.
     if (SectionOrder(form) == 0)
         return ErrInvalidSelector;
-    const Outcome outcome = RunCascade(form, a, b, state, clears, x.data(), x.size());
+    const Outcome outcome = RunCascade(form, a, b, state, clears, x.view());
     return outcome.isHosts() ? outcome : EmptiedOnFailure(x, outcome);
 }
 
-enum SampleMode : int32_t { SecondOrderSections = 0, FourthOrderSections, DirectIIR, DirectFIR };
+// The first modes are the forms of sections.
+enum SampleMode : int32_t { DirectIIR = FourthOrderSections + 1, DirectFIR };
 
-template <class Signal, class State>
-Outcome RunSample(typename State::T *x, int32_t mode, const In<DBL1D> &a, const In<DBL1D> &b,
-                  State &state, bool clears) {
+template <class Signal>
+Outcome RunSample(typename HandleTraits<Signal>::T *sample, int32_t mode, const In<DBL1D> &a,
+                  const In<DBL1D> &b, InOut<Signal> &state, bool clears) {
     if (mode < SecondOrderSections || mode > DirectFIR)
         return ErrInvalidSelector;
     const bool isCascade = mode < DirectIIR;
@@ -200,9 +201,10 @@ Outcome RunSample(typename State::T *x, int32_t mode, const In<DBL1D> &a, const 
         return 0;
     if (path == Path::Missing)
         return ErrSizesDisagree;
+    const VectorView<HandleTraits<Signal>::code> x(sample, 1);
     if (isCascade)
-        return RunCascade(mode, a, b, state, clears, x, 1);
-    return RunJoined<Signal>(path, a, b, state, clears, x, 1);
+        return RunCascade(mode, a, b, state, clears, x);
+    return RunJoined<Signal>(path, a, b, state, clears, x);
 }
 
 // kept: a failure leaves 0 in the sample, and not the NaN of other scalars.

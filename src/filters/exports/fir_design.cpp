@@ -21,7 +21,7 @@ Outcome CutOff(FilterBand band, int32_t taps, Out<DBL1D> h, int32_t *type) {
     *type = std::clamp<int32_t>(*type, Lowpass, Bandstop);
     if (const Outcome bad = h.resize(taps))
         return bad;
-    return DesignFIRWindowless(*type, band.fs, band.fl, band.fh, taps, h.data());
+    return DesignFIRWindowless(static_cast<FilterType>(*type), band, h.view());
 }
 
 bool HasInfinity(const In<RemezBand1D> &bands) {
@@ -35,7 +35,7 @@ bool HasInfinity(const In<RemezBand1D> &bands) {
 }
 
 // kept: iterations that run out leave the last deviation in *ripple, so it is no OutDBL; and the
-// function result tells that the design itself had no memory.
+// function result says that the design itself had no memory.
 Outcome Equiripple(int32_t n, double fs, In<RemezBand1D> bands, int32_t type, Out<DBL1D> h,
                    double *ripple, int32_t maxIterations) {
     constexpr int32_t designHasNoMemory = 2;
@@ -48,7 +48,7 @@ Outcome Equiripple(int32_t n, double fs, In<RemezBand1D> bands, int32_t type, Ou
     if (const Outcome bad = h.resize(n))
         return bad;
     const ErrorCode status =
-        DesignEquiripple(bands.size(), bands.data(), fs, type, n, h.data(), ripple, maxIterations);
+        DesignEquiripple(bands.size(), bands.data(), fs, type, h.view(), ripple, maxIterations);
     return status == ErrOutOfMemory ? Outcome::OfHost(designHasNoMemory) : Outcome(status);
 }
 
@@ -98,8 +98,7 @@ public:
         : design_(design), model_(design->model), interpolator_(design->interpolator) {}
 
     NarrowFIRFilter filter() const {
-        return {design_->kind,        design_->M,    model_.size(),
-                interpolator_.size(), model_.data(), interpolator_.data()};
+        return {design_->kind, design_->M, model_.view(), interpolator_.view()};
     }
     auto inputs() { return std::tie(model_, interpolator_); }
 
@@ -107,29 +106,6 @@ private:
     const NarrowFIRDesign *design_;
     In<DBL1D> model_, interpolator_;
 };
-
-ErrorCode FilterSignal(const NarrowFIRFilter &filter, const In<DBL1D> &x,
-                       Out<DBL1D, OnFailure::Keep> &y) {
-    return FilterNarrowFIR(x.data(), x.size(), filter, y.data());
-}
-
-// The parts of a complex signal one after the other.
-ErrorCode FilterSignal(const NarrowFIRFilter &filter, const In<CDB1D> &x,
-                       Out<CDB1D, OnFailure::Keep> &y) {
-    Scratch<ElementType::DBL> part, filtered;
-    if (part.allocate(x.size()) != 0 || filtered.allocate(y.size()) != 0)
-        return ErrOutOfMemory;
-    for (DBL CDB::*which : {&CDB::re, &CDB::im}) {
-        for (std::ptrdiff_t i = 0; i < x.size(); ++i)
-            part[i] = x.data()[i].*which;
-        if (const ErrorCode failed =
-                FilterNarrowFIR(part.data(), x.size(), filter, filtered.data()))
-            return failed;
-        for (std::ptrdiff_t i = 0; i < y.size(); ++i)
-            y.data()[i].*which = filtered[i];
-    }
-    return 0;
-}
 
 template <class Signal>
 Outcome RunNarrow(const NarrowFIRFilter &filter, const In<Signal> &x,
@@ -141,7 +117,7 @@ Outcome RunNarrow(const NarrowFIRFilter &filter, const In<Signal> &x,
         return ErrOutOfMemory;
     if (const Outcome bad = y.resize(static_cast<int32_t>(count)))
         return bad;
-    return FilterSignal(filter, x, y);
+    return FilterNarrowFIR<HandleTraits<Signal>::code>(x.view(), filter, y.view());
 }
 
 // kept: an empty x leaves y as it is.

@@ -20,10 +20,27 @@ struct Arguments {
     }
 };
 
-// `design` takes the band and the request.
-template <class Design>
-Outcome DesignInto(const Arguments &arguments, int32_t form, const Design &design, Out<DBL1D> &a,
-                   Out<DBL1D> &b) {
+ErrorCode CheckBand(const Arguments &arguments) {
+    const auto &[fs, fl, fh] = arguments.band;
+    const bool isRising = !(fl >= fh); // NaN passes
+    return FirstFailed({{arguments.order < 1, ErrOrderNotPositive},
+                        {fl <= 0.0 || fh <= 0.0 || !isRising || fs <= 0.0, ErrBadCutoff}});
+}
+
+bool IsAboveNyquist(const FilterBand &band) {
+    const double nyquist = band.fs * 0.5;
+    return band.fh > nyquist || band.fl > nyquist;
+}
+
+bool HasBadSelector(const Arguments &arguments, int32_t form) {
+    return arguments.type < Lowpass || arguments.type > Bandstop || SectionOrder(form) == 0;
+}
+
+// The checks come when the outputs have their sizes: check() those of the design, then that of the
+// selectors. `design` takes the band and the request.
+template <class Check, class Design>
+Outcome DesignInto(const Arguments &arguments, int32_t form, const Check &check,
+                   const Design &design, Out<DBL1D> &a, Out<DBL1D> &b) {
     const CascadeSizes sizes = SizesOfCascade(arguments.type, arguments.order, form);
     if (sizes.a < 1)
         return ErrOrderNotPositive;
@@ -31,39 +48,61 @@ Outcome DesignInto(const Arguments &arguments, int32_t form, const Design &desig
         return bad;
     if (const Outcome bad = b.resize(sizes.b))
         return bad;
-    return design(arguments.band, IIRDesignRequest{arguments.type, arguments.order, a.size(),
-                                                   a.data(), b.size(), b.data(), form});
+    if (const ErrorCode failed = CheckBand(arguments))
+        return failed;
+    if (const ErrorCode failed = check(IsAboveNyquist(arguments.band)))
+        return failed;
+    if (HasBadSelector(arguments, form))
+        return ErrInvalidSelector;
+    return design(arguments.band,
+                  IIRDesignRequest{arguments.type, arguments.order, a.view(), b.view(), form});
 }
 
+ErrorCode CheckNyquist(bool isAbove) { return isAbove ? ErrAboveNyquist : 0; }
+
 Outcome Butterworth(Arguments arguments, int32_t form, Out<DBL1D> a, Out<DBL1D> b) {
-    return DesignInto(arguments, form, DesignButterworth, a, b);
+    return DesignInto(arguments, form, CheckNyquist, DesignButterworth, a, b);
 }
 
 Outcome Bessel(Arguments arguments, int32_t form, Out<DBL1D> a, Out<DBL1D> b) {
-    return DesignInto(arguments, form, DesignBessel, a, b);
+    return DesignInto(arguments, form, CheckNyquist, DesignBessel, a, b);
 }
 
 Outcome Chebyshev(Arguments arguments, double ripple, int32_t form, Out<DBL1D> a, Out<DBL1D> b) {
-    const auto design = [&](const FilterBand &band, const IIRDesignRequest &request) {
+    const auto check = [=](bool isAbove) {
+        return FirstFailed({{isAbove, ErrAboveNyquist}, {ripple <= 0.0, ErrRippleNotPositive}});
+    };
+    const auto design = [=](const FilterBand &band, const IIRDesignRequest &request) {
         return DesignChebyshev(band, ripple, request);
     };
-    return DesignInto(arguments, form, design, a, b);
+    return DesignInto(arguments, form, check, design, a, b);
 }
 
+// kept: unlike in the elliptic design, the attenuation comes before the Nyquist frequency.
 Outcome InvChebyshev(Arguments arguments, double attenuation, int32_t form, Out<DBL1D> a,
                      Out<DBL1D> b) {
-    const auto design = [&](const FilterBand &band, const IIRDesignRequest &request) {
+    const auto check = [=](bool isAbove) {
+        return FirstFailed(
+            {{attenuation <= 0.0, ErrAttenuationNotPositive}, {isAbove, ErrAboveNyquist}});
+    };
+    const auto design = [=](const FilterBand &band, const IIRDesignRequest &request) {
         return DesignInvChebyshev(band, attenuation, request);
     };
-    return DesignInto(arguments, form, design, a, b);
+    return DesignInto(arguments, form, check, design, a, b);
 }
 
 Outcome Elliptic(Arguments arguments, double ripple, double attenuation, int32_t form, Out<DBL1D> a,
                  Out<DBL1D> b) {
-    const auto design = [&](const FilterBand &band, const IIRDesignRequest &request) {
+    const auto check = [=](bool isAbove) {
+        return FirstFailed({{isAbove, ErrAboveNyquist},
+                            {ripple <= 0.0, ErrRippleNotPositive},
+                            {attenuation <= 0.0, ErrAttenuationNotPositive},
+                            {ripple >= attenuation, ErrRippleAboveAttenuation}});
+    };
+    const auto design = [=](const FilterBand &band, const IIRDesignRequest &request) {
         return DesignElliptic(band, ripple, attenuation, request);
     };
-    return DesignInto(arguments, form, design, a, b);
+    return DesignInto(arguments, form, check, design, a, b);
 }
 
 } // namespace

@@ -40,8 +40,14 @@ Outcome SmoothByFit(In<DBL1D> x, int32_t order, int32_t frame, In<DBL1D> weights
     return SavitzkyGolayFilter(x.data(), x.size(), order, frame, DataOrNull(weights), y.data());
 }
 
+// A right rank below 0 is the left one.
 Outcome SmoothByMedian(InOut<DBL1D> x, int32_t leftRank, int32_t rightRank) {
-    return MedianFilterRun(x.data(), x.size(), leftRank, rightRank, x.data());
+    const int32_t right = rightRank < 0 ? leftRank : rightRank;
+    if (const ErrorCode failed =
+            FirstFailed({{leftRank < 0, ErrNegativeCount},
+                         {!x.isEmpty() && x.size() <= right, ErrSizesDisagree}}))
+        return failed;
+    return MedianFilterRun(x.view(), leftRank, right, x.view());
 }
 
 } // namespace

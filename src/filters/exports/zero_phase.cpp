@@ -31,9 +31,8 @@ Outcome RunDirect(Kept &x, const In<DBL1D> &a, const In<DBL1D> &b, Kept *const (
     if (clears)
         for (Kept *const state : states)
             Clear(*state);
-    return ZeroPhaseDirect(a.data(), a.size(), b.data(), b.size(),
-                           {xForward->data(), yForward->data()},
-                           {xBackward->data(), yBackward->data()}, x.data(), x.size());
+    return ZeroPhaseDirect(a.view(), b.view(), {xForward->view(), yForward->view()},
+                           {xBackward->view(), yBackward->view()}, x.view());
 }
 
 // Failures leave x as it is.
@@ -69,8 +68,7 @@ Outcome FilterCascade(Kept x, int32_t form, In<DBL1D> a, In<DBL1D> b, Kept forwa
         Clear(forward);
         Clear(backward);
     }
-    return ZeroPhaseCascade({a.data(), a.size(), b.data(), b.size(), form}, forward.data(),
-                            backward.data(), x.data(), x.size());
+    return ZeroPhaseCascade({a.view(), b.view(), form}, forward.view(), backward.view(), x.view());
 }
 
 } // namespace

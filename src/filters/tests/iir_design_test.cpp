@@ -258,7 +258,7 @@ void ExpectSplit(const Quadratic &p, const Quadratic &q) {
     const double a[4] = {p.c + q.c, p.d + q.d + p.c * q.c, p.c * q.d + q.c * p.d, p.d * q.d};
     const double b[5] = {2, 2 * (p.c + q.c), 2 * (2 + p.c * q.c), 2 * (p.c + q.c), 2};
     double A[4], B[6];
-    ASSERT_EQ(qx::FourthToSecondOrder({a, 4, b, 5, 1}, {A, 4, B, 6}), 0);
+    ASSERT_EQ(qx::FourthToSecondOrder({{a, 4}, {b, 5}, 1}, {{A, 4}, {B, 6}}), 0);
     const double productA[4] = {A[0] + A[2], A[1] + A[3] + A[0] * A[2], A[0] * A[3] + A[1] * A[2],
                                 A[1] * A[3]};
     const double productB[5] = {B[0] * B[3], B[0] * B[4] + B[1] * B[3],
@@ -284,8 +284,10 @@ TEST(IIRDesign, SplitsSectionsIntoFactors) {
                     {-2 * (1 - near) * std::cos(2 * near), (1 - near) * (1 - near)});
     const double a[4] = {}, b[5] = {};
     double out[6];
-    EXPECT_EQ(qx::FourthToSecondOrder({a, 4, b, 4, 1}, {out, 4, out, 6}), ErrCoefficientSizes);
-    EXPECT_EQ(qx::SecondToFourthOrder({a, 4, b, 6, 0}, {out, 3, out, 5}), ErrCoefficientSizes);
+    EXPECT_EQ(qx::FourthToSecondOrder({{a, 4}, {b, 4}, 1}, {{out, 4}, {out, 6}}),
+              ErrCoefficientSizes);
+    EXPECT_EQ(qx::SecondToFourthOrder({{a, 4}, {b, 6}, 0}, {{out, 3}, {out, 5}}),
+              ErrCoefficientSizes);
 }
 
 // Where the gain of filters of even order is below 1, in the middle of their band.

@@ -9,8 +9,6 @@
 namespace qx {
 namespace {
 
-const DBL *Values(const In<CDB1D> &in) { return &in.data()->re; }
-
 // The size of a convolution, refused as memory that cannot be had where int32 does not hold it.
 template <class X, class Y, class Output>
 Outcome ResizeToFull(const X &x, const Y &y, Output &out) {
@@ -25,7 +23,7 @@ Outcome Convolve(In<DBL1D> x, In<DBL1D> y, Out<DBL1D> out, int32_t algorithm) {
         return ErrEmptyInput;
     if (const Outcome bad = ResizeToFull(x, y, out))
         return bad;
-    return ConvolveReal(x.data(), x.size(), y.data(), y.size(), algorithm, out.data());
+    return ConvolveReal(x.view(), y.view(), algorithm, out.view());
 }
 
 Outcome Correlate(In<DBL1D> x, In<DBL1D> y, Out<DBL1D> out, int32_t algorithm,
@@ -34,8 +32,7 @@ Outcome Correlate(In<DBL1D> x, In<DBL1D> y, Out<DBL1D> out, int32_t algorithm,
         return ErrEmptyInput;
     if (const Outcome bad = ResizeToFull(x, y, out))
         return bad;
-    return CorrelateReal(x.data(), x.size(), y.data(), y.size(), algorithm, out.data(),
-                         normalization);
+    return CorrelateReal(x.view(), y.view(), algorithm, normalization, out.view());
 }
 
 Outcome ComplexInto(const In<CDB1D> &x, const In<CDB1D> &y, Out<CDB1D, OnFailure::Keep> &out,
@@ -43,12 +40,10 @@ Outcome ComplexInto(const In<CDB1D> &x, const In<CDB1D> &y, Out<CDB1D, OnFailure
     if (const Outcome bad = ResizeToFull(x, y, out))
         return bad;
     if (correlate == 0)
-        return ConvolveComplex(Values(x), x.size(), Values(y), y.size(), &out.data()->re,
-                               algorithm);
+        return ConvolveComplex(x.view(), y.view(), algorithm, out.view());
     if (normalization < NotNormalized || normalization > Biased)
         return ErrInvalidSelector;
-    return CorrelateComplex(Values(x), x.size(), Values(y), y.size(), &out.data()->re, algorithm,
-                            normalization);
+    return CorrelateComplex(x.view(), y.view(), algorithm, normalization, out.view());
 }
 
 Outcome ConvolveOrCorrelate(In<CDB1D> x, In<CDB1D> y, Out<CDB1D, OnFailure::Keep> out,
@@ -73,19 +68,19 @@ Outcome AutoCorrelate(InOut<DBL1D, OnFailure::Keep> x, const DBL1D &handle, int3
     if (const ErrorCode failed = copy.allocate(n))
         return failed;
     std::memcpy(copy.data(), x.data(), sizeof(DBL) * static_cast<std::size_t>(n));
+    const ConstRealVector series(copy.data(), n);
     const int32_t count = 2 * n - 1;
     if (!x.resize(count).failed()) {
         // Where the work lacks memory this is what follows the n values.
         Fill(x.data() + n, n - 1, 0.0);
-        return CorrelateReal(copy.data(), n, copy.data(), n, ConvolveByTransform, x.data(),
-                             normalization);
+        return CorrelateReal(series, series, ConvolveByTransform, normalization, x.view());
     }
     // The block still holds n values and no more.
     (*handle)->dimSize = count;
     if (const ErrorCode failed = unheld.allocate(count))
         return failed;
-    const ErrorCode status = CorrelateReal(copy.data(), n, copy.data(), n, ConvolveByTransform,
-                                           unheld.data(), normalization);
+    const ErrorCode status =
+        CorrelateReal(series, series, ConvolveByTransform, normalization, {unheld.data(), count});
     std::memcpy(x.data(), unheld.data(), sizeof(DBL) * static_cast<std::size_t>(n));
     return status;
 }
@@ -98,8 +93,7 @@ Outcome Deconvolve(InOut<DBL1D> xy, const DBL1D &handle, In<DBL1D> y) {
                          {xy.isEmpty() || y.isEmpty(), ErrEmptyInput},
                          {count < 1, ErrSizesDisagree}}))
         return failed;
-    if (const ErrorCode failed =
-            DeconvolveReal(xy.data(), xy.size(), y.data(), y.size(), xy.data()))
+    if (const ErrorCode failed = DeconvolveReal(xy.view(), y.view(), xy.view().part(0, count)))
         return failed;
     // kept: the size is set whatever the host says to it.
     (void)xy.resize(count);

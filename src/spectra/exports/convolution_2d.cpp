@@ -2,28 +2,11 @@
 
 #include "frame/export.h"
 #include "qx/convolution_2d.h"
-#include "spectra/convolution.h"
 
 #include <limits>
 
 namespace qx {
 namespace {
-
-// What the twins call.
-struct RealMatrices {
-    typedef DBL2D Handle;
-    static const DBL *values(const In<DBL2D> &in) { return in.data(); }
-    static DBL *values(const Out<DBL2D, OnFailure::Keep> &out) { return out.data(); }
-    static constexpr auto convolve = Convolve2DReal;
-    static constexpr auto correlate = Correlate2DReal;
-};
-struct ComplexMatrices {
-    typedef CDB2D Handle;
-    static const DBL *values(const In<CDB2D> &in) { return &in.data()->re; }
-    static DBL *values(const Out<CDB2D, OnFailure::Keep> &out) { return &out.data()->re; }
-    static constexpr auto convolve = Convolve2DComplex;
-    static constexpr auto correlate = Correlate2DComplex;
-};
 
 // The number of rows or of columns of a result, beyond int32 perhaps.
 int64_t ResultSize(int32_t outputSize, int32_t x, int32_t y) {
@@ -37,9 +20,9 @@ int64_t ResultSize(int32_t outputSize, int32_t x, int32_t y) {
     }
 }
 
-template <class Matrices>
-Outcome ResizeResult(const In<typename Matrices::Handle> &x, const In<typename Matrices::Handle> &y,
-                     int32_t outputSize, Out<typename Matrices::Handle, OnFailure::Keep> &out) {
+template <class Handle>
+Outcome ResizeResult(const In<Handle> &x, const In<Handle> &y, int32_t outputSize,
+                     Out<Handle, OnFailure::Keep> &out) {
     const int64_t rows = ResultSize(outputSize, x.rows(), y.rows());
     const int64_t cols = ResultSize(outputSize, x.cols(), y.cols());
     constexpr int64_t most = std::numeric_limits<int32_t>::max();
@@ -56,9 +39,8 @@ Outcome EmptiedOnFailure(Output &out, Outcome outcome) {
 }
 
 // kept: the first checks leave the output as it is; every later failure empties it.
-template <class Matrices>
-Outcome Convolve(In<typename Matrices::Handle> x, In<typename Matrices::Handle> y,
-                 Out<typename Matrices::Handle, OnFailure::Keep> out, int32_t outputSize,
+template <class Handle>
+Outcome Convolve(In<Handle> x, In<Handle> y, Out<Handle, OnFailure::Keep> out, int32_t outputSize,
                  int32_t algorithm) {
     if (const ErrorCode failed =
             FirstFailed({{x.isEmpty() || y.isEmpty(), ErrEmptyInput},
@@ -66,23 +48,21 @@ Outcome Convolve(In<typename Matrices::Handle> x, In<typename Matrices::Handle> 
                          {outputSize == ValidPart && (x.rows() < y.rows() || x.cols() < y.cols()),
                           ErrSizesDisagree}}))
         return failed;
-    if (const Outcome bad = ResizeResult<Matrices>(x, y, outputSize, out))
+    if (const Outcome bad = ResizeResult(x, y, outputSize, out))
         return EmptiedOnFailure(out, bad);
-    return EmptiedOnFailure(out, Matrices::convolve(Matrices::values(x), x.rows(), x.cols(),
-                                                    Matrices::values(y), y.rows(), y.cols(),
-                                                    Matrices::values(out), outputSize, algorithm));
+    return EmptiedOnFailure(
+        out, Convolve2D<HandleTraits<Handle>::code>(
+                 x.view(), y.view(), static_cast<OutputSize>(outputSize), algorithm, out.view()));
 }
 
-template <class Matrices>
-Outcome Correlate(In<typename Matrices::Handle> x, In<typename Matrices::Handle> y,
-                  Out<typename Matrices::Handle, OnFailure::Keep> out, int32_t algorithm) {
+template <class Handle>
+Outcome Correlate(In<Handle> x, In<Handle> y, Out<Handle, OnFailure::Keep> out, int32_t algorithm) {
     if (x.isEmpty() || y.isEmpty())
         return ErrEmptyInput;
-    if (const Outcome bad = ResizeResult<Matrices>(x, y, FullSize, out))
+    if (const Outcome bad = ResizeResult(x, y, FullSize, out))
         return EmptiedOnFailure(out, bad);
-    return EmptiedOnFailure(out, Matrices::correlate(Matrices::values(x), x.rows(), x.cols(),
-                                                     Matrices::values(y), y.rows(), y.cols(),
-                                                     Matrices::values(out), algorithm));
+    return EmptiedOnFailure(
+        out, Correlate2D<HandleTraits<Handle>::code>(x.view(), y.view(), algorithm, out.view()));
 }
 
 } // namespace
@@ -91,17 +71,17 @@ Outcome Correlate(In<typename Matrices::Handle> x, In<typename Matrices::Handle>
 using qx::Returned;
 
 ErrorCode Convolve_2DH(DBL2D x, DBL2D y, DBL2D out, int32_t outputSize, int32_t algorithm) {
-    return Returned(qx::Convolve<qx::RealMatrices>, x, y, out, outputSize, algorithm);
+    return Returned(qx::Convolve<DBL2D>, x, y, out, outputSize, algorithm);
 }
 
 ErrorCode CxConvolve_2DH(CDB2D x, CDB2D y, CDB2D out, int32_t outputSize, int32_t algorithm) {
-    return Returned(qx::Convolve<qx::ComplexMatrices>, x, y, out, outputSize, algorithm);
+    return Returned(qx::Convolve<CDB2D>, x, y, out, outputSize, algorithm);
 }
 
 ErrorCode Correlation_2DH(DBL2D x, DBL2D y, DBL2D out, int32_t algorithm) {
-    return Returned(qx::Correlate<qx::RealMatrices>, x, y, out, algorithm);
+    return Returned(qx::Correlate<DBL2D>, x, y, out, algorithm);
 }
 
 ErrorCode CxCorrelation_2DH(CDB2D x, CDB2D y, CDB2D out, int32_t algorithm) {
-    return Returned(qx::Correlate<qx::ComplexMatrices>, x, y, out, algorithm);
+    return Returned(qx::Correlate<CDB2D>, x, y, out, algorithm);
 }

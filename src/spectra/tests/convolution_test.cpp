@@ -73,15 +73,19 @@ bool SameValues(const Signal &a, const Signal &b) {
     });
 }
 
+qx::ConstRealVector View(const Signal &x) { return {x.data(), SizeOf(x)}; }
+qx::RealVector View(Signal &x) { return {x.data(), SizeOf(x)}; }
+
 Signal Directly(const Signal &x, const Signal &y) {
     Signal out(x.size() + y.size() - 1, 99.0);
-    EXPECT_EQ(qx::ConvolveReal(x.data(), SizeOf(x), y.data(), SizeOf(y), 0, out.data()), 0);
+    EXPECT_EQ(qx::ConvolveReal(View(x), View(y), qx::ConvolveDirectly, View(out)), 0);
     return out;
 }
 
 Signal CorrelatedDirectly(const Signal &x, const Signal &y) {
     Signal out(x.size() + y.size() - 1, 99.0);
-    EXPECT_EQ(qx::CorrelateReal(x.data(), SizeOf(x), y.data(), SizeOf(y), 0, out.data(), 0), 0);
+    EXPECT_EQ(
+        qx::CorrelateReal(View(x), View(y), qx::ConvolveDirectly, qx::NotNormalized, View(out)), 0);
     return out;
 }
 
@@ -125,7 +129,9 @@ TEST(Convolution, ComplexDirectSumsKeepTheirOrderToTheBit) {
                 expected[i + j].re += a.re * b.re - a.im * b.im;
                 expected[i + j].im += a.im * b.re + a.re * b.im;
             }
-        ASSERT_EQ(qx::ConvolveComplex(Values(x), nx, Values(y), ny, Values(out), 0), 0);
+        ASSERT_EQ(qx::ConvolveComplex({x.data(), nx}, {y.data(), ny}, qx::ConvolveDirectly,
+                                      {out.data(), nx + ny - 1}),
+                  0);
         EXPECT_TRUE(SameBits(out, expected));
     }
 }

@@ -14,7 +14,7 @@ Outcome Forward(In<Input> in, CDB a, CDB w, int32_t count, uint32_t method, Out<
     const int32_t points = count < 1 ? in.size() : count;
     if (const Outcome bad = out.resize(points))
         return bad;
-    return ChirpZ(in.data(), in.size(), a, w, method, out.data(), points);
+    return ChirpZ(in.view(), a, w, static_cast<ChirpMethod>(method), out.view());
 }
 
 Outcome Inverse(In<CDB1D> in, CDB a, CDB w, int32_t count, Out<CDB1D> out) {
@@ -24,7 +24,7 @@ Outcome Inverse(In<CDB1D> in, CDB a, CDB w, int32_t count, Out<CDB1D> out) {
         return failed;
     if (const Outcome bad = out.resize(points))
         return bad;
-    return InverseChirpZ(in.data(), in.size(), a, w, out.data(), points);
+    return InverseChirpZ(in.view(), a, w, out.view());
 }
 
 } // namespace
