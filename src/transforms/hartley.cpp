@@ -1,40 +1,31 @@
 #include "transforms/hartley.h"
 
-#include "fft/plan.h"
 #include "frame/heap_block.h"
 
 #include <cstddef>
-#include <optional>
 
 namespace qx {
 namespace {
 
-// The half-complex spectrum of n values in a block from the heap, with the plan that made it.
-struct HalfSpectrum {
-    HeapBlock<ElementType::DBL> h;
-    std::optional<PlanReference> plan;
+typedef HeapBlock<ElementType::DBL> HalfSpectrum;
 
-    ErrorCode take(const DBL *x, int32_t n) {
-        if (const ErrorCode failed = h.allocate(n))
-            return failed;
-        plan.emplace(n);
-        if (!*plan)
-            return ErrOutOfMemory;
-        return FFTRealForward(plan->get(), x, h.data(), 1, 1, n);
-    }
-};
+// The half-complex spectrum of x in a block from the heap.
+ErrorCode Transform(const FFTPlan *plan, ConstRealVector x, HalfSpectrum &h) {
+    QX_EXPECTS(plan->length == x.size());
+    if (const ErrorCode failed = h.allocate(plan->length))
+        return failed;
+    return FFTRealForward(plan, x.data(), h.data(), 1, 1, plan->length);
+}
 
 } // namespace
 
-ErrorCode FastHartley(DBL *x, int32_t n) {
-    if (n < 1)
-        return ErrEmptyInput;
+ErrorCode FastHartley(const FFTPlan *plan, RealVector x) {
+    const std::ptrdiff_t n = x.size();
     if (n == 1)
         return 0;
-    HalfSpectrum spectrum;
-    if (const ErrorCode failed = spectrum.take(x, n))
+    HalfSpectrum h;
+    if (const ErrorCode failed = Transform(plan, x, h))
         return failed;
-    DBL *const h = spectrum.h.data();
     x[0] = h[0];
     for (std::ptrdiff_t k = 1; k <= (n - 1) / 2; ++k) {
         const double re = h[k];
@@ -47,26 +38,24 @@ ErrorCode FastHartley(DBL *x, int32_t n) {
     return 0;
 }
 
-ErrorCode FastHartleyInverse(DBL *x, int32_t n) {
-    if (const ErrorCode failed = FastHartley(x, n))
+ErrorCode FastHartleyInverse(const FFTPlan *plan, RealVector x) {
+    if (const ErrorCode failed = FastHartley(plan, x))
         return failed;
-    const double scale = 1.0 / n;
-    for (std::ptrdiff_t j = 0; j < n; ++j)
-        x[j] *= scale;
+    const double scale = 1.0 / static_cast<double>(x.size());
+    for (auto &value : x)
+        value *= scale;
     return 0;
 }
 
-ErrorCode FastHilbert(DBL *x, int32_t n) {
-    if (n < 1)
-        return ErrEmptyInput;
+ErrorCode FastHilbert(const FFTPlan *plan, RealVector x) {
+    const std::ptrdiff_t n = x.size();
     if (n == 1) {
         x[0] = 0;
         return 0;
     }
-    HalfSpectrum spectrum;
-    if (const ErrorCode failed = spectrum.take(x, n))
+    HalfSpectrum h;
+    if (const ErrorCode failed = Transform(plan, x, h))
         return failed;
-    DBL *const h = spectrum.h.data();
     h[0] = 0;
     if (n % 2 == 0)
         h[n / 2] = 0;
@@ -75,14 +64,14 @@ ErrorCode FastHilbert(DBL *x, int32_t n) {
         h[k] = h[n - k];
         h[n - k] = -re;
     }
-    return FFTRealInverse(spectrum.plan->get(), h, x, 1, 1, n);
+    return FFTRealInverse(plan, h.data(), x.data(), 1, 1, plan->length);
 }
 
-ErrorCode FastHilbertInverse(DBL *x, int32_t n) {
-    if (const ErrorCode failed = FastHilbert(x, n))
+ErrorCode FastHilbertInverse(const FFTPlan *plan, RealVector x) {
+    if (const ErrorCode failed = FastHilbert(plan, x))
         return failed;
-    for (std::ptrdiff_t j = 0; j < n; ++j)
-        x[j] = -x[j];
+    for (auto &value : x)
+        value = -value;
     return 0;
 }
 

@@ -26,75 +26,73 @@ struct WorkBlock {
 
 // transform(const DBL *in, DBL *out) for each row.
 template <class Transform>
-ErrorCode TransformRows(const DBL *in, DBL *out, int32_t rows, int32_t cols, Transform transform) {
-    for (int64_t r = 0; r < rows; ++r)
-        if (const ErrorCode failed = transform(in + r * cols, out + r * cols))
+ErrorCode TransformRows(ConstRealMatrix in, RealMatrix out, Transform transform) {
+    for (std::ptrdiff_t r = 0; r < in.rows(); ++r)
+        if (const ErrorCode failed = transform(in.row(r), out.row(r)))
             return failed;
     return 0;
 }
 
 template <class Transform>
-ErrorCode TransformColumns(const DBL *in, DBL *out, int32_t rows, int32_t cols, DBL *columns,
-                           Transform transform) {
+ErrorCode TransformColumns(ConstRealMatrix in, RealMatrix out, DBL *columns, Transform transform) {
+    const int32_t rows = in.rows(), cols = in.cols();
     const int64_t pitch = PaddedPitch(rows);
     for (int32_t c = 0; c < cols; c += ColumnsAtOnce) {
         const int32_t count = ColumnsInBlock(c, cols);
-        GatherColumns<ElementType::DBL>(in + c, cols, rows, count, columns, pitch);
+        GatherColumns<ElementType::DBL>(in.data() + c, cols, rows, count, columns, pitch);
         for (int32_t i = 0; i < count; ++i)
             if (const ErrorCode failed = transform(columns + i * pitch, columns + i * pitch))
                 return failed;
-        ScatterColumns<ElementType::DBL>(columns, pitch, rows, count, out + c, cols);
+        ScatterColumns<ElementType::DBL>(columns, pitch, rows, count, out.data() + c, cols);
     }
     return 0;
 }
-
-} // namespace
-
-ErrorCode MatrixWindow::take(const DBL *in, int32_t inRows, int32_t inCols, int32_t rows,
-                             int32_t cols) {
-    data = in;
-    if (rows == inRows && cols == inCols)
-        return 0;
-    if (const ErrorCode failed = copy.allocateCleared(int64_t{rows} * cols))
-        return failed;
-    const std::size_t bytes = static_cast<std::size_t>(std::min(cols, inCols)) * sizeof(DBL);
-    for (int64_t r = 0; r < std::min(rows, inRows); ++r)
-        std::memcpy(copy.data() + r * cols, in + r * inCols, bytes);
-    data = copy.data();
-    return 0;
-}
-
-namespace {
 
 // `transform` makes one transform of n values: plan, from, to, n.
 template <class Transform>
-ErrorCode InBothDirections(const FFTPlan *columnPlan, const FFTPlan *rowPlan, const DBL *in,
-                           DBL *out, int32_t rows, int32_t cols, bool columnsFirst, DBL *columns,
+ErrorCode InBothDirections(const FFTPlan *columnPlan, const FFTPlan *rowPlan, ConstRealMatrix in,
+                           RealMatrix out, bool columnsFirst, DBL *columns,
                            const Transform &transform) {
+    QX_EXPECTS(in.isWhole() && out.isWhole() && in.rows() == out.rows() && in.cols() == out.cols());
     const auto along = [&](const FFTPlan *plan, int32_t n) {
         return [=, &transform](const DBL *from, DBL *to) { return transform(plan, from, to, n); };
     };
+    const auto alongColumns = along(columnPlan, in.rows());
+    const auto alongRows = along(rowPlan, in.cols());
     if (columnsFirst) {
-        if (const ErrorCode failed =
-                TransformColumns(in, out, rows, cols, columns, along(columnPlan, rows)))
+        if (const ErrorCode failed = TransformColumns(in, out, columns, alongColumns))
             return failed;
-        return TransformRows(out, out, rows, cols, along(rowPlan, cols));
+        return TransformRows(out, out, alongRows);
     }
-    if (const ErrorCode failed = TransformRows(in, out, rows, cols, along(rowPlan, cols)))
+    if (const ErrorCode failed = TransformRows(in, out, alongRows))
         return failed;
-    return TransformColumns(out, out, rows, cols, columns, along(columnPlan, rows));
+    return TransformColumns(out, out, columns, alongColumns);
 }
 
 } // namespace
 
-template <class Transform>
-ErrorCode SeparableForward(const FFTPlan *columnPlan, const FFTPlan *rowPlan, const DBL *in,
-                           DBL *out, int32_t rows, int32_t cols) {
-    WorkBlock work;
-    if (const ErrorCode failed =
-            work.take(Transform::forwardWork(rows), Transform::forwardWork(cols), rows))
+ErrorCode MatrixWindow::take(ConstRealMatrix in, int32_t rows, int32_t cols) {
+    view = in;
+    if (rows == in.rows() && cols == in.cols())
+        return 0;
+    if (const ErrorCode failed = copy.allocateCleared(int64_t{rows} * cols))
         return failed;
-    return InBothDirections(columnPlan, rowPlan, in, out, rows, cols, false, work.columns,
+    const RealMatrix padded(copy.data(), rows, cols);
+    const std::size_t bytes = static_cast<std::size_t>(std::min(cols, in.cols())) * sizeof(DBL);
+    for (std::ptrdiff_t r = 0; r < std::min(rows, in.rows()); ++r)
+        std::memcpy(padded.row(r), in.row(r), bytes);
+    view = padded;
+    return 0;
+}
+
+template <class Transform>
+ErrorCode SeparableForward(const FFTPlan *columnPlan, const FFTPlan *rowPlan, ConstRealMatrix in,
+                           RealMatrix out) {
+    WorkBlock work;
+    if (const ErrorCode failed = work.take(Transform::forwardWork(in.rows()),
+                                           Transform::forwardWork(in.cols()), in.rows()))
+        return failed;
+    return InBothDirections(columnPlan, rowPlan, in, out, false, work.columns,
                             [&](const FFTPlan *plan, const DBL *from, DBL *to, int32_t n) {
                                 return Transform::forward(plan, from, n, to, 1, 1, n,
                                                           work.block.data());
@@ -102,26 +100,26 @@ ErrorCode SeparableForward(const FFTPlan *columnPlan, const FFTPlan *rowPlan, co
 }
 
 template <class Transform>
-ErrorCode SeparableInverse(const FFTPlan *columnPlan, const FFTPlan *rowPlan, const DBL *in,
-                           DBL *out, int32_t rows, int32_t cols) {
+ErrorCode SeparableInverse(const FFTPlan *columnPlan, const FFTPlan *rowPlan, ConstRealMatrix in,
+                           RealMatrix out) {
     WorkBlock work;
-    if (const ErrorCode failed =
-            work.take(Transform::inverseWork(rows), Transform::inverseWork(cols), rows))
+    if (const ErrorCode failed = work.take(Transform::inverseWork(in.rows()),
+                                           Transform::inverseWork(in.cols()), in.rows()))
         return failed;
     return InBothDirections(
-        columnPlan, rowPlan, in, out, rows, cols, Transform::inverseRunsColumnsFirst, work.columns,
+        columnPlan, rowPlan, in, out, Transform::inverseRunsColumnsFirst, work.columns,
         [&](const FFTPlan *plan, const DBL *from, DBL *to, int32_t n) {
             return Transform::inverse(from, to, 1, 1, n, work.block.data(), plan);
         });
 }
 
-template ErrorCode SeparableForward<CosineTransform>(const FFTPlan *, const FFTPlan *, const DBL *,
-                                                     DBL *, int32_t, int32_t);
-template ErrorCode SeparableForward<SineTransform>(const FFTPlan *, const FFTPlan *, const DBL *,
-                                                   DBL *, int32_t, int32_t);
-template ErrorCode SeparableInverse<CosineTransform>(const FFTPlan *, const FFTPlan *, const DBL *,
-                                                     DBL *, int32_t, int32_t);
-template ErrorCode SeparableInverse<SineTransform>(const FFTPlan *, const FFTPlan *, const DBL *,
-                                                   DBL *, int32_t, int32_t);
+#define QX_INSTANTIATE(Transform)                                                                  \
+    template ErrorCode SeparableForward<Transform>(const FFTPlan *, const FFTPlan *,               \
+                                                   ConstRealMatrix, RealMatrix);                   \
+    template ErrorCode SeparableInverse<Transform>(const FFTPlan *, const FFTPlan *,               \
+                                                   ConstRealMatrix, RealMatrix);
+
+QX_INSTANTIATE(CosineTransform)
+QX_INSTANTIATE(SineTransform)
 
 } // namespace qx

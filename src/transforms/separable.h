@@ -2,6 +2,7 @@
 #define QX_TRANSFORMS_SEPARABLE_H
 
 #include "frame/heap_block.h"
+#include "frame/views.h"
 #include "transforms/dct.h"
 #include "transforms/dst.h"
 
@@ -34,20 +35,20 @@ struct SineTransform {
 // The upper left rows by cols values of a matrix, with zeros to the right and below where it is
 // smaller: the matrix itself where the shapes agree, else a heap copy. 0 or ErrOutOfMemory.
 struct MatrixWindow {
-    const DBL *data;
+    ConstRealMatrix view;
     HeapBlock<ElementType::DBL> copy;
 
-    ErrorCode take(const DBL *in, int32_t inRows, int32_t inCols, int32_t rows, int32_t cols);
+    ErrorCode take(ConstRealMatrix in, int32_t rows, int32_t cols);
 };
 
-// Row-major matrices of rows by cols values; columnPlan serves the transforms of `rows` values,
-// rowPlan those of `cols`. The codes of the 1-D routines.
+// Matrices of one size; columnPlan serves the transforms of the columns, rowPlan those of the rows.
+// The codes of the 1-D routines.
 template <class Transform>
-ErrorCode SeparableForward(const FFTPlan *columnPlan, const FFTPlan *rowPlan, const DBL *in,
-                           DBL *out, int32_t rows, int32_t cols);
+ErrorCode SeparableForward(const FFTPlan *columnPlan, const FFTPlan *rowPlan, ConstRealMatrix in,
+                           RealMatrix out);
 template <class Transform>
-ErrorCode SeparableInverse(const FFTPlan *columnPlan, const FFTPlan *rowPlan, const DBL *in,
-                           DBL *out, int32_t rows, int32_t cols);
+ErrorCode SeparableInverse(const FFTPlan *columnPlan, const FFTPlan *rowPlan, ConstRealMatrix in,
+                           RealMatrix out);
 
 } // namespace qx
 

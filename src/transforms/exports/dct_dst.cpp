@@ -86,24 +86,22 @@ Outcome Forward2D(In<DBL2D> in, Out<DBL2D> out, int32_t rows, int32_t cols, Keep
     if (!out.mayHave(rows, cols)) // before memory is taken for so many values
         return ErrOutOfMemory;
     MatrixWindow window;
-    if (const ErrorCode failed = window.take(in.data(), in.rows(), in.cols(), rows, cols))
+    if (const ErrorCode failed = window.take(in.view(), rows, cols))
         return failed;
     if (const Outcome bad = TakePlansAndReshape<Transform>(keep, out, rows, cols))
         return bad;
     return SeparableForward<typename Transform::Routines>(keep.plan(), keep.secondPlan(),
-                                                          window.data, out.data(), rows, cols);
+                                                          window.view, out.view());
 }
 
 template <class Transform, class Keep>
 Outcome Inverse2D(In<DBL2D> in, Out<DBL2D> out, Keep keep) {
     if (in.isEmpty())
         return ErrEmptyInput;
-    const int32_t rows = in.rows();
-    const int32_t cols = in.cols();
-    if (const Outcome bad = TakePlansAndReshape<Transform>(keep, out, rows, cols))
+    if (const Outcome bad = TakePlansAndReshape<Transform>(keep, out, in.rows(), in.cols()))
         return bad;
-    return SeparableInverse<typename Transform::Routines>(keep.plan(), keep.secondPlan(), in.data(),
-                                                          out.data(), rows, cols);
+    return SeparableInverse<typename Transform::Routines>(keep.plan(), keep.secondPlan(), in.view(),
+                                                          out.view());
 }
 
 } // namespace

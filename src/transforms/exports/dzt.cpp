@@ -23,8 +23,8 @@ ErrorCode Band(Spoiled<Handle> in, int32_t sections, int32_t subLength, int32_t 
     // kept: the host's own status counts as a code, and a positive one leaves the output alone.
     if (const Outcome bad = out.resize(size))
         return bad.raw();
-    return BandTransform<HandleTraits<Handle>::code>(keep.plan(), in.data(), in.size(), sections,
-                                                     subLength, start, size, out.data());
+    return BandTransform<HandleTraits<Handle>::code>(keep.plan(), in.view(), sections, subLength,
+                                                     start, out.view());
 }
 
 } // namespace

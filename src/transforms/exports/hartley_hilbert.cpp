@@ -7,27 +7,24 @@
 namespace qx {
 namespace {
 
-// In both bodies the kept plan only holds the length in the cache: the inner routines take a
-// reference of their own.
-
 template <auto Transform, class Keep>
 ErrorCode InPlace(InOut<DBL1D> x, Keep keep) {
     if (x.isEmpty())
         return ErrEmptyInput;
     if (const ErrorCode failed = keep.acquire(x.size()))
         return failed;
-    return Transform(x.data(), x.size());
+    return Transform(keep.plan(), x.view());
 }
 
 // kept: without a plan the inverse Hartley transform leaves its array untouched; any other failure
 // empties it.
 template <class Keep>
 ErrorCode HartleyInverse(InOut<DBL1D, OnFailure::Keep> x, Keep keep) {
-    ErrorCode status = x.isEmpty() ? ErrEmptyInput : 0;
-    if (status == 0) {
+    ErrorCode status = ErrEmptyInput;
+    if (!x.isEmpty()) {
         if (const ErrorCode failed = keep.acquire(x.size()))
             return failed;
-        status = FastHartleyInverse(x.data(), x.size());
+        status = FastHartleyInverse(keep.plan(), x.view());
     }
     if (status < 0)
         x.empty();

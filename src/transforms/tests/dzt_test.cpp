@@ -135,8 +135,8 @@ TEST(BandTransform, TheInnerRoutineChecksItsPlan) {
     Signal x = RandomSignal(8);
     std::vector<CDB> out(2);
     const auto run = [&](const FFTPlan *with, int32_t n, int32_t sections, int32_t subLength) {
-        return qx::BandTransform<qx::ElementType::DBL>(with, x.data(), n, sections, subLength, 0, 2,
-                                                       out.data());
+        return qx::BandTransform<qx::ElementType::DBL>(with, {x.data(), n}, sections, subLength, 0,
+                                                       {out.data(), 2});
     };
     EXPECT_EQ(run(nullptr, 0, 0, 0), ErrEmptyInput);
     EXPECT_EQ(run(nullptr, 8, 0, 4), ErrFFTSizeNotPositive);
