@@ -42,8 +42,8 @@ int main() {
             const qx::CosineCoefficients &coefs = qx::CosineWindowCoefs(window.selector);
             const auto [ours, plain] = qx::bench::LeastTimes(
                 [&] {
-                    qx::ApplyCosineWindowBySelector(qx::RealSignal(x.data()), n, window.selector,
-                                                    0);
+                    qx::ApplyCosineWindowBySelector(qx::RealVector(x.data(), n), window.selector,
+                                                    false);
                 },
                 [&] { OneCosinePerTerm(x.data(), n, coefs); });
             std::printf("%-32s %10d %12.0f %8.3f\n", window.name, n, ours * 1e9, ours / plain);

@@ -37,15 +37,16 @@ ErrorCode WindowConstantsFromTable(int32_t selector, WindowConstants *constants)
     return ErrInvalidSelector;
 }
 
-ErrorCode MeasureWindowConstants(const DBL *w, int32_t n, WindowConstants *constants) {
-    if (n < 1)
+ErrorCode MeasureWindowConstants(ConstRealVector w, WindowConstants *constants) {
+    if (w.isEmpty())
         return ErrEmptyInput;
     double sum = 0.0;
     double squares = 0.0;
-    for (int32_t i = 0; i < n; ++i) {
-        sum += w[i];
-        squares += w[i] * w[i];
+    for (const double value : w) {
+        sum += value;
+        squares += value * value;
     }
+    const auto n = static_cast<double>(w.size());
     *constants = {n * squares / (sum * sum), sum / n};
     return 0;
 }
@@ -57,11 +58,14 @@ ErrorCode WindowConstantsByName(int32_t n, int32_t selector, double param,
     if (CosineWindowCoefs(selector).count > 0)
         return WindowConstantsFromTable(selector, constants);
 
-    Scratch<ElementType::DBL> window;
-    ErrorCode status = GenerateForMeasurement(n, selector, param, window);
+    RealVector window;
+    ScratchParts memory;
+    if (const ErrorCode status = memory.take(Sized(window, n)))
+        return status;
+    ErrorCode status = GenerateForMeasurement(window, selector, param);
     if (status == 0)
-        status = MeasureWindowConstants(window.data(), n, constants);
-    return Merge(status, window.release());
+        status = MeasureWindowConstants(window, constants);
+    return Merge(status, memory.release());
 }
 
 } // namespace qx

@@ -1,6 +1,7 @@
 #ifndef QX_WINDOWS_CONSTANTS_H
 #define QX_WINDOWS_CONSTANTS_H
 
+#include "frame/views.h"
 #include "qx/errors.h"
 #include "qx/windows.h"
 
@@ -10,7 +11,7 @@ namespace qx {
 ErrorCode WindowConstantsFromTable(int32_t selector, WindowConstants *constants);
 
 // cg = sum(w) / n and enbw = n sum(w^2) / sum(w)^2, NaN for a window of zeros. ErrEmptyInput.
-ErrorCode MeasureWindowConstants(const DBL *w, int32_t n, WindowConstants *constants);
+ErrorCode MeasureWindowConstants(ConstRealVector w, WindowConstants *constants);
 
 // The constants of a named window of n samples: stored ones for selectors 0 to 9 and 11, else
 // measured. `param` as the window's own routine takes it. ErrEmptyInput, ErrInvalidSelector.

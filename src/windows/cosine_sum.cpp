@@ -12,7 +12,7 @@ namespace {
 // The terms of a sum as they rotate: cosine and sine parts of b[k] exp(2 pi i j k / n) for the
 // present sample j, and the rotation by one sample.
 struct Terms {
-    DBL *cosine, *sine, *alpha, *beta;
+    RealVector cosine = {}, sine = {}, alpha = {}, beta = {};
     int32_t count;
     double constant;
 
@@ -57,15 +57,16 @@ struct FixedTerms {
 };
 
 // Samples 1 to n-1; the second half mirrors the first.
-template <class Signal, class Sum>
-void Run(Signal x, int32_t n, Sum sum) {
+template <ElementType E, class Sum>
+void Run(VectorView<E> x, Sum sum) {
+    const int32_t n = Count(x);
     for (int32_t i = 1; i <= (n - 1) / 2; ++i) {
         const double w = sum.next();
-        x.scale(i, w);
-        x.scale(n - i, w);
+        Scale(x[i], w);
+        Scale(x[n - i], w);
     }
     if (n % 2 == 0)
-        x.scale(n / 2, sum.next());
+        Scale(x[n / 2], sum.next());
 }
 
 } // namespace
@@ -92,8 +93,9 @@ const CosineCoefficients &CosineWindowCoefs(int32_t selector) {
     return table[selector < 0 || selector > last ? none : selector];
 }
 
-template <class Signal>
-ErrorCode ApplyCosineSumWindow(Signal x, int32_t n, const DBL *a, int32_t m, int32_t scaled) {
+template <ElementType E>
+ErrorCode ApplyCosineSumWindow(VectorView<E> x, ConstRealVector a, bool scaled) {
+    const int32_t n = Count(x), m = static_cast<int32_t>(a.size());
     if (n < 1)
         return ErrEmptyInput;
     if (n == 1)
@@ -103,17 +105,13 @@ ErrorCode ApplyCosineSumWindow(Signal x, int32_t n, const DBL *a, int32_t m, int
     if (m == 1 && a[0] == 1.0)
         return 0;
 
-    Scratch<ElementType::DBL> state;
-    if (const ErrorCode status = state.allocate(4 * int64_t{m}))
-        return status;
-    const double divisor = scaled != 0 ? a[0] : 1.0;
+    const double divisor = scaled ? a[0] : 1.0;
     const int32_t count = m - 1;
-    Terms terms = {state.data(),
-                   state.data() + m,
-                   state.data() + 2 * std::ptrdiff_t{m},
-                   state.data() + 3 * std::ptrdiff_t{m},
-                   count,
-                   a[0] / divisor};
+    Terms terms{.count = count, .constant = a[0] / divisor};
+    ScratchParts memory;
+    if (const ErrorCode status = memory.take(Sized(terms.cosine, count), Sized(terms.sine, count),
+                                             Sized(terms.alpha, count), Sized(terms.beta, count)))
+        return status;
     double first = terms.constant;
     for (int32_t k = 1; k <= count; ++k) {
         const double half = std::sin(kPi * k / n);
@@ -123,43 +121,44 @@ ErrorCode ApplyCosineSumWindow(Signal x, int32_t n, const DBL *a, int32_t m, int
         terms.sine[k - 1] = 0.0;
         first += terms.cosine[k - 1];
     }
-    x.scale(0, first);
+    Scale(x[0], first);
 
     switch (count) {
     case 1:
-        Run(x, n, FixedTerms<1>(terms));
+        Run(x, FixedTerms<1>(terms));
         break;
     case 2:
-        Run(x, n, FixedTerms<2>(terms));
+        Run(x, FixedTerms<2>(terms));
         break;
     case 3:
-        Run(x, n, FixedTerms<3>(terms));
+        Run(x, FixedTerms<3>(terms));
         break;
     case 4:
-        Run(x, n, FixedTerms<4>(terms));
+        Run(x, FixedTerms<4>(terms));
         break;
     case 6:
-        Run(x, n, FixedTerms<6>(terms));
+        Run(x, FixedTerms<6>(terms));
         break;
     default:
-        Run(x, n, terms);
+        Run(x, terms);
     }
-    return state.release();
+    return memory.release();
 }
 
-template <class Signal>
-ErrorCode ApplyCosineWindowBySelector(Signal x, int32_t n, int32_t selector, int32_t scaled) {
+template <ElementType E>
+ErrorCode ApplyCosineWindowBySelector(VectorView<E> x, int32_t selector, bool scaled) {
+    const int32_t n = Count(x);
     if (n < 1)
         return ErrEmptyInput;
     const CosineCoefficients &coefs = CosineWindowCoefs(selector);
     if (coefs.count == 0)
         return ErrInvalidSelector;
-    return ApplyCosineSumWindow(x, n, coefs.a, coefs.count, scaled);
+    return ApplyCosineSumWindow(x, {coefs.a, coefs.count}, scaled);
 }
 
-template ErrorCode ApplyCosineSumWindow(RealSignal, int32_t, const DBL *, int32_t, int32_t);
-template ErrorCode ApplyCosineSumWindow(ComplexSignal, int32_t, const DBL *, int32_t, int32_t);
-template ErrorCode ApplyCosineWindowBySelector(RealSignal, int32_t, int32_t, int32_t);
-template ErrorCode ApplyCosineWindowBySelector(ComplexSignal, int32_t, int32_t, int32_t);
+template ErrorCode ApplyCosineSumWindow(RealVector, ConstRealVector, bool);
+template ErrorCode ApplyCosineSumWindow(ComplexVector, ConstRealVector, bool);
+template ErrorCode ApplyCosineWindowBySelector(RealVector, int32_t, bool);
+template ErrorCode ApplyCosineWindowBySelector(ComplexVector, int32_t, bool);
 
 } // namespace qx

@@ -14,17 +14,17 @@ struct CosineCoefficients {
 };
 const CosineCoefficients &CosineWindowCoefs(int32_t selector);
 
-// x[i] times the sum over k of (-1)^k a[k] cos(2 pi k i / n) / d, with d = a[0] if `scaled` is
-// non-zero, else 1. One sine pair per term, then a rotation per sample in the form "old value
-// minus a correction", which keeps the sum accurate over long arrays (Singleton: On computing
-// the fast Fourier transform, 1967, for the recurrence).
-// ErrEmptyInput for n < 1, then, except for n = 1, for m < 1.
-template <class Signal>
-ErrorCode ApplyCosineSumWindow(Signal x, int32_t n, const DBL *a, int32_t m, int32_t scaled);
+// x[i] times the sum over k of (-1)^k a[k] cos(2 pi k i / n) / d, with d = a[0] where `scaled`,
+// else 1. One sine pair per term, then a rotation per sample in the form "old value minus a
+// correction", which keeps the sum accurate over long arrays (Singleton: On computing the fast
+// Fourier transform, 1967, for the recurrence). ErrEmptyInput for n < 1, then, except for n = 1,
+// for an empty a.
+template <ElementType E>
+ErrorCode ApplyCosineSumWindow(VectorView<E> x, ConstRealVector a, bool scaled);
 
 // ErrEmptyInput for n < 1, ErrInvalidSelector for a selector without coefficients.
-template <class Signal>
-ErrorCode ApplyCosineWindowBySelector(Signal x, int32_t n, int32_t selector, int32_t scaled);
+template <ElementType E>
+ErrorCode ApplyCosineWindowBySelector(VectorView<E> x, int32_t selector, bool scaled);
 
 } // namespace qx
 

@@ -6,18 +6,13 @@
 
 namespace qx {
 
-// The Dolph-Chebyshev window of `length` >= 2 values, not normalised: the inverse transform of
-// T[length-1](x0 cos(pi k / length)), whose side lobes all lie `ratio` below the main lobe
-// (C. L. Dolph: A current distribution for broadside arrays which optimizes the relationship
-// between beam width and side-lobe level, 1946). *peak is its largest value.
-// ErrOutOfMemory.
-ErrorCode GenerateDolChebyWindow(DBL *w, double *peak, int32_t length, double ratio);
-
-// Multiplies by the window with its peak brought to 1: of n values if `symmetric` is non-zero,
-// else the first n of n + 1, which is the periodic form. The ratio is linear and not checked:
-// below 1 it gives NaN. ErrEmptyInput, ErrOutOfMemory.
-template <class Signal>
-ErrorCode ApplyDolChebyWindow(Signal x, int32_t n, double ratio, int32_t symmetric);
+// The Dolph-Chebyshev window, whose side lobes all lie `ratio` below the main lobe (C. L. Dolph: A
+// current distribution for broadside arrays which optimizes the relationship between beam width
+// and side-lobe level, 1946), with its peak brought to 1: of n values where `symmetric`, else the
+// first n of n + 1, which is the periodic form. The ratio is linear and not checked: below 1 it
+// gives NaN. A single sample is left as it is. ErrEmptyInput, ErrOutOfMemory.
+template <ElementType E>
+ErrorCode ApplyDolChebyWindow(VectorView<E> x, double ratio, bool symmetric);
 
 } // namespace qx
 

@@ -1,5 +1,6 @@
 #include "windows/selection.h"
 
+#include "frame/scratch.h"
 #include "windows/constants.h"
 #include "windows/dolph_chebyshev.h"
 #include "windows/tapers.h"
@@ -31,51 +32,44 @@ bool IsCosineSum(int32_t selector) {
 }
 
 // Selectors 30 to 34 and 60 to 62: the windows whose periodic form other routines build on.
-template <class Signal>
-ErrorCode ApplyPeriodicShape(Signal x, int32_t n, int32_t selector, double param) {
+template <ElementType E>
+ErrorCode ApplyPeriodicShape(VectorView<E> x, int32_t selector, double param) {
     switch (selector) {
     case Triangle:
-        return ApplyTriangleWindow(x, n);
+        return ApplyTriangleWindow(x);
     case BartlettHanning:
-        return ApplyBartHannWindow(x, n);
+        return ApplyBartHannWindow(x);
     case Bohman:
-        return ApplyBohmanWindow(x, n);
+        return ApplyBohmanWindow(x);
     case Parzen:
-        return ApplyParzenWindow(x, n);
+        return ApplyParzenWindow(x);
     case Welch:
-        return ApplyWelchWindow(x, n);
+        return ApplyWelchWindow(x);
     case Kaiser:
-        return ApplyKaiserWindow(x, n, param);
+        return ApplyKaiserWindow(x, param);
     case DolphChebyshev:
-        return ApplyDolChebyWindow(x, n, param, 0);
+        return ApplyDolChebyWindow(x, param, false);
     case Gaussian:
-        return ApplyGaussWindow(x, n, param, 0);
+        return ApplyGaussWindow(x, param, false);
     default:
         return ErrInvalidSelector;
     }
 }
 
-ErrorCode AllocateOnes(Scratch<ElementType::DBL> &window, int32_t n) {
-    if (const ErrorCode status = window.allocate(n))
-        return status;
-    for (int32_t i = 0; i < n; ++i)
-        window[i] = 1.0;
-    return 0;
-}
-
-// The symmetric window over n ones.
-ErrorCode GenerateSymmetric(DBL *w, int32_t n, int32_t selector, double param) {
+// The symmetric window over ones.
+ErrorCode GenerateSymmetric(RealVector w, int32_t selector, double param) {
     if (selector == Rectangle)
         return 0;
     if (selector == DolphChebyshev)
-        return ApplyDolChebyWindow(RealSignal(w), n, param, 1);
+        return ApplyDolChebyWindow(w, param, true);
     if (selector == Gaussian)
-        return ApplyGaussWindow(RealSignal(w), n, param, 1);
+        return ApplyGaussWindow(w, param, true);
     // The periodic window of one sample less, closed by its first sample.
+    const RealVector periodic = w.part(0, w.size() - 1);
     const ErrorCode status = IsCosineSum(selector)
-                                 ? ApplyCosineWindowBySelector(RealSignal(w), n - 1, selector, 0)
-                                 : ApplyPeriodicShape(RealSignal(w), n - 1, selector, param);
-    w[n - 1] = w[0];
+                                 ? ApplyCosineWindowBySelector(periodic, selector, false)
+                                 : ApplyPeriodicShape(periodic, selector, param);
+    w[w.size() - 1] = w[0];
     return status;
 }
 
@@ -106,86 +100,87 @@ double PreparedWindowParam(int32_t selector, double param) {
     return selector == DolphChebyshev ? std::pow(10.0, value / 20.0) : value;
 }
 
-ErrorCode GenerateForMeasurement(int32_t n, int32_t selector, double param,
-                                 Scratch<ElementType::DBL> &window) {
-    if (const ErrorCode status = AllocateOnes(window, n))
-        return status;
-    return ApplyPeriodicShape(RealSignal(window.data()), n, selector, param);
+ErrorCode GenerateForMeasurement(RealVector w, int32_t selector, double param) {
+    Fill(w.data(), w.size(), 1.0);
+    return ApplyPeriodicShape(w, selector, param);
 }
 
-template <class Signal>
-ErrorCode ApplySymmetricWindow(int32_t selector, Signal x, int32_t n, double param) {
-    if (n <= 1)
-        return n < 1 ? ErrEmptyInput : 0;
-    Scratch<ElementType::DBL> window;
-    if (const ErrorCode status = AllocateOnes(window, n))
+template <ElementType E>
+ErrorCode ApplySymmetricWindow(int32_t selector, VectorView<E> x, double param) {
+    if (x.size() <= 1)
+        return x.isEmpty() ? ErrEmptyInput : 0;
+    RealVector window;
+    ScratchParts memory;
+    if (const ErrorCode status = memory.take(Sized(window, x.size())))
         return status;
-    const ErrorCode status = GenerateSymmetric(window.data(), n, selector, param);
+    Fill(window.data(), window.size(), 1.0);
+    const ErrorCode status = GenerateSymmetric(window, selector, param);
     if (status == 0)
-        Multiply(x, n, window.data());
-    return Merge(status, window.release());
+        Multiply<E>(x, window);
+    return Merge(status, memory.release());
 }
 
-template <class Signal>
-ErrorCode ApplyScaledWindow(Signal x, int32_t n, int32_t selector, double param,
+template <ElementType E>
+ErrorCode ApplyScaledWindow(VectorView<E> x, int32_t selector, double param,
                             WindowConstants *constants) {
-    if (n < 0)
-        return ErrNegativeDimension;
     if (selector == Rectangle) {
         *constants = {1.0, 1.0};
         return 0;
     }
     if (IsCosineSum(selector)) {
         const ErrorCode status = WindowConstantsFromTable(selector, constants);
-        return status != 0 || n == 0 ? status : ApplyCosineWindowBySelector(x, n, selector, 1);
+        return status != 0 || x.isEmpty() ? status : ApplyCosineWindowBySelector(x, selector, true);
     }
 
-    Scratch<ElementType::DBL> window;
-    ErrorCode status = GenerateForMeasurement(n, selector, param, window);
+    RealVector window;
+    ScratchParts memory;
+    if (const ErrorCode status = memory.take(Sized(window, x.size())))
+        return status;
+    ErrorCode status = GenerateForMeasurement(window, selector, param);
     if (status == 0)
-        status = MeasureWindowConstants(window.data(), n, constants);
+        status = MeasureWindowConstants(window, constants);
     if (status == 0) {
         const double gain = 1.0 / constants->cg;
-        for (int32_t i = 0; i < n; ++i)
-            x.scale(i, window[i] * gain);
+        for (std::ptrdiff_t i = 0; i < x.size(); ++i)
+            Scale(x[i], window[i] * gain);
     }
-    return Merge(status, window.release());
+    return Merge(status, memory.release());
 }
 
-template <class Signal>
-ErrorCode ApplyWindowBySelector(Signal x, int32_t n, int32_t selector, double param, int32_t scaled,
-                                int32_t symmetric) {
-    if (scaled != 0 && symmetric != 0)
+template <ElementType E>
+ErrorCode ApplyWindowBySelector(VectorView<E> x, int32_t selector, double param, bool scaled,
+                                bool symmetric) {
+    if (scaled && symmetric)
         return ErrInvalidSelector;
     const double value = PreparedWindowParam(selector, param);
-    if (scaled != 0) {
+    if (scaled) {
         WindowConstants discarded;
-        return ApplyScaledWindow(x, n, selector, value, &discarded);
+        return ApplyScaledWindow(x, selector, value, &discarded);
     }
-    if (symmetric != 0)
-        return ApplySymmetricWindow(selector, x, n, value);
+    if (symmetric)
+        return ApplySymmetricWindow(selector, x, value);
     if (selector == Rectangle)
         return 0;
     if (IsCosineSum(selector))
-        return ApplyCosineWindowBySelector(x, n, selector, 0);
+        return ApplyCosineWindowBySelector(x, selector, false);
     switch (selector) {
     case CosineTapered:
-        return ApplyCosTaperedWindow(x, n, value);
+        return ApplyCosTaperedWindow(x, value);
     case Force:
-        return ApplyForceWindow(x, n, value);
+        return ApplyForceWindow(x, value);
     case Exponential:
-        return ApplyExpWindow(x, n, value);
+        return ApplyExpWindow(x, value);
     default:
-        return ApplyPeriodicShape(x, n, selector, value);
+        return ApplyPeriodicShape(x, selector, value);
     }
 }
 
-#define QX_INSTANTIATE(Signal)                                                                     \
-    template ErrorCode ApplySymmetricWindow(int32_t, Signal, int32_t, double);                     \
-    template ErrorCode ApplyScaledWindow(Signal, int32_t, int32_t, double, WindowConstants *);     \
-    template ErrorCode ApplyWindowBySelector(Signal, int32_t, int32_t, double, int32_t, int32_t);
+#define QX_INSTANTIATE(Samples)                                                                    \
+    template ErrorCode ApplySymmetricWindow(int32_t, Samples, double);                             \
+    template ErrorCode ApplyScaledWindow(Samples, int32_t, double, WindowConstants *);             \
+    template ErrorCode ApplyWindowBySelector(Samples, int32_t, double, bool, bool);
 
-QX_INSTANTIATE(RealSignal)
-QX_INSTANTIATE(ComplexSignal)
+QX_INSTANTIATE(RealVector)
+QX_INSTANTIATE(ComplexVector)
 
 } // namespace qx

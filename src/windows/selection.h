@@ -1,7 +1,6 @@
 #ifndef QX_WINDOWS_SELECTION_H
 #define QX_WINDOWS_SELECTION_H
 
-#include "frame/scratch.h"
 #include "qx/windows.h"
 #include "windows/cosine_sum.h"
 
@@ -18,25 +17,24 @@ double WindowDefaultParam(int32_t selector, double param);
 double PreparedWindowParam(int32_t selector, double param);
 
 // The symmetric form: the mirror of sample i is n - 1 - i. ErrEmptyInput, ErrInvalidSelector.
-template <class Signal>
-ErrorCode ApplySymmetricWindow(int32_t selector, Signal x, int32_t n, double param);
+template <ElementType E>
+ErrorCode ApplySymmetricWindow(int32_t selector, VectorView<E> x, double param);
 
 // The periodic form divided by its coherent gain. `constants` are those of the window before
-// the division. ErrNegativeDimension, ErrInvalidSelector.
-template <class Signal>
-ErrorCode ApplyScaledWindow(Signal x, int32_t n, int32_t selector, double param,
+// the division. ErrInvalidSelector.
+template <ElementType E>
+ErrorCode ApplyScaledWindow(VectorView<E> x, int32_t selector, double param,
                             WindowConstants *constants);
 
 // Any window in any form. ErrInvalidSelector for a form that does not exist, then the codes of
 // the window.
-template <class Signal>
-ErrorCode ApplyWindowBySelector(Signal x, int32_t n, int32_t selector, double param, int32_t scaled,
-                                int32_t symmetric);
+template <ElementType E>
+ErrorCode ApplyWindowBySelector(VectorView<E> x, int32_t selector, double param, bool scaled,
+                                bool symmetric);
 
-// The periodic, unscaled window of selectors 30 to 34 and 60 to 62 in scratch memory, for
-// measuring it. ErrInvalidSelector.
-ErrorCode GenerateForMeasurement(int32_t n, int32_t selector, double param,
-                                 Scratch<ElementType::DBL> &window);
+// The periodic, unscaled window of selectors 30 to 34 and 60 to 62 itself, for measuring it.
+// ErrInvalidSelector.
+ErrorCode GenerateForMeasurement(RealVector w, int32_t selector, double param);
 
 } // namespace qx
 

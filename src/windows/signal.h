@@ -1,37 +1,32 @@
 #ifndef QX_WINDOWS_SIGNAL_H
 #define QX_WINDOWS_SIGNAL_H
 
-#include "frame/elements.h"
+#include "frame/views.h"
 
 #include <cstddef>
 
 namespace qx {
 
-// What a window multiplies: the real and the complex form of every window are one text over
-// these two. A complex sample has both parts multiplied by the same real value.
+// What a window does to a sample: the real and the complex form of every window are one text over
+// these. A complex sample has both parts multiplied by the same real value.
+inline void Scale(DBL &sample, double w) { sample *= w; }
+inline void Scale(CDB &sample, double w) {
+    sample.re *= w;
+    sample.im *= w;
+}
+inline void Clear(DBL &sample) { sample = 0.0; }
+inline void Clear(CDB &sample) { sample = {0.0, 0.0}; }
 
-struct RealSignal {
-    RealSignal(DBL *samples) : x(samples) {}
-    void scale(std::ptrdiff_t i, double w) const { x[i] *= w; }
-    void clear(std::ptrdiff_t i) const { x[i] = 0.0; }
-    DBL *x;
-};
+template <ElementType E>
+int32_t Count(VectorView<E> x) {
+    return static_cast<int32_t>(x.size());
+}
 
-struct ComplexSignal {
-    ComplexSignal(CDB *samples) : x(samples) {}
-    void scale(std::ptrdiff_t i, double w) const {
-        x[i].re *= w;
-        x[i].im *= w;
-    }
-    void clear(std::ptrdiff_t i) const { x[i] = {0.0, 0.0}; }
-    CDB *x;
-};
-
-// Multiplies n samples by the window w.
-template <class Signal>
-void Multiply(Signal x, int32_t n, const DBL *w) {
-    for (int32_t i = 0; i < n; ++i)
-        x.scale(i, w[i]);
+// Multiplies the samples by the first values of w.
+template <ElementType E>
+void Multiply(VectorView<E> x, ConstRealVector w) {
+    for (std::ptrdiff_t i = 0; i < x.size(); ++i)
+        Scale(x[i], w[i]);
 }
 
 } // namespace qx

@@ -4,7 +4,6 @@
 #include "windows/cosine_sum.h"
 
 #include <cmath>
-#include <type_traits>
 
 namespace qx {
 
@@ -24,17 +23,18 @@ struct Rotation {
 
 // A window that is 0 at sample 0 and mirrored about n/2, from its value at 1, 2, ...; `value` is
 // asked for these in order, and for the middle sample of an even n.
-template <class Signal, class Value>
-void ScaleMirrored(Signal x, int32_t n, Value value) {
-    x.scale(0, 0.0);
+template <ElementType E, class Value>
+void ScaleMirrored(VectorView<E> x, Value value) {
+    const int32_t n = Count(x);
+    Scale(x[0], 0.0);
     const int32_t half = n / 2 + n % 2;
     for (int32_t i = 1; i < half; ++i) {
         const double w = value(i);
-        x.scale(i, w);
-        x.scale(n - i, w);
+        Scale(x[i], w);
+        Scale(x[n - i], w);
     }
     if (n % 2 == 0)
-        x.scale(half, value(half));
+        Scale(x[half], value(half));
 }
 
 // The modified Bessel function of order 0, as far as a window needs it.
@@ -65,58 +65,62 @@ int32_t SampleCount(double samples, int32_t n) {
 
 } // namespace
 
-template <class Signal>
-ErrorCode ApplyTriangleWindow(Signal x, int32_t n) {
+template <ElementType E>
+ErrorCode ApplyTriangleWindow(VectorView<E> x) {
+    const int32_t n = Count(x);
     if (n < 1)
         return ErrEmptyInput;
-    x.clear(0); // kept: also for a single sample, unlike every other window
+    Clear(x[0]); // kept: also for a single sample, unlike every other window
     const double delta = 2.0 / n;
     // The middle sample of an even n is its own mirror and is scaled by 1 twice.
     for (int32_t i = 1; i <= n / 2; ++i) {
         const double w = i * delta;
-        x.scale(i, w);
-        x.scale(n - i, w);
+        Scale(x[i], w);
+        Scale(x[n - i], w);
     }
     return 0;
 }
 
-template <class Signal>
-ErrorCode ApplyWelchWindow(Signal x, int32_t n) {
+template <ElementType E>
+ErrorCode ApplyWelchWindow(VectorView<E> x) {
+    const int32_t n = Count(x);
     if (n <= 1)
         return n < 1 ? ErrEmptyInput : 0;
     const double middle = 0.5 * n;
     const double scale = (1.0 / middle) / middle;
-    ScaleMirrored(x, n, [=](int32_t i) {
+    ScaleMirrored(x, [=](int32_t i) {
         const double t = i - middle;
         return 1.0 - t * t * scale;
     });
     return 0;
 }
 
-template <class Signal>
-ErrorCode ApplyBartHannWindow(Signal x, int32_t n) {
+template <ElementType E>
+ErrorCode ApplyBartHannWindow(VectorView<E> x) {
+    const int32_t n = Count(x);
     if (n <= 1)
         return n < 1 ? ErrEmptyInput : 0;
     if (n == 2) {
-        x.scale(0, 0.0);
+        Scale(x[0], 0.0);
         return 0;
     }
     Rotation rotation(2.0 * kPi / n);
-    ScaleMirrored(x, n, [=](int32_t i) mutable {
+    ScaleMirrored(x, [=](int32_t i) mutable {
         rotation.advance();
         return 0.62 - 0.48 * std::fabs(static_cast<double>(i) / n - 0.5) - 0.38 * rotation.cosine;
     });
     return 0;
 }
 
-template <class Signal>
-ErrorCode ApplyParzenWindow(Signal x, int32_t n) {
+template <ElementType E>
+ErrorCode ApplyParzenWindow(VectorView<E> x) {
+    const int32_t n = Count(x);
     if (n <= 1)
         return n < 1 ? ErrEmptyInput : 0;
     const double middle = 0.5 * n;
     const double c1 = (6.0 / middle) / middle;
     const double c2 = c1 / middle;
-    ScaleMirrored(x, n, [=](int32_t i) {
+    ScaleMirrored(x, [=](int32_t i) {
         const double t = std::fabs(i - middle);
         if (t > 0.5 * middle) {
             const double u = 1.0 - t / middle;
@@ -127,28 +131,30 @@ ErrorCode ApplyParzenWindow(Signal x, int32_t n) {
     return 0;
 }
 
-template <class Signal>
-ErrorCode ApplyBohmanWindow(Signal x, int32_t n) {
+template <ElementType E>
+ErrorCode ApplyBohmanWindow(VectorView<E> x) {
+    const int32_t n = Count(x);
     if (n <= 1)
         return n < 1 ? ErrEmptyInput : 0;
     if (n == 2) {
-        x.scale(0, 0.0);
+        Scale(x[0], 0.0);
         return 0;
     }
     Rotation rotation(2.0 * kPi / n);
-    ScaleMirrored(x, n, [=](int32_t i) mutable {
+    ScaleMirrored(x, [=](int32_t i) mutable {
         rotation.advance();
         return rotation.sine * kInversePi - 2.0 * i / n * rotation.cosine;
     });
     return 0;
 }
 
-template <class Signal>
-ErrorCode ApplyKaiserWindow(Signal x, int32_t n, double beta) {
+template <ElementType E>
+ErrorCode ApplyKaiserWindow(VectorView<E> x, double beta) {
+    const int32_t n = Count(x);
     if (n < 1)
         return ErrEmptyInput;
     const double peak = KaiserBesselI0(beta);
-    x.scale(0, KaiserBesselI0(0.0) / peak);
+    Scale(x[0], KaiserBesselI0(0.0) / peak);
     const double step = 2.0 / n;
     // The middle sample of an even n has the factor 1 and is left as it is.
     const int32_t last = n % 2 == 0 ? n / 2 - 1 : n / 2;
@@ -156,57 +162,60 @@ ErrorCode ApplyKaiserWindow(Signal x, int32_t n, double beta) {
         const double u = 1.0 - i * step;
         const double v = std::sqrt(1.0 - u * u);
         const double w = KaiserBesselI0(v * beta) / peak;
-        x.scale(i, w);
-        x.scale(n - i, w);
+        Scale(x[i], w);
+        Scale(x[n - i], w);
     }
     return 0;
 }
 
-template <class Signal>
-ErrorCode ApplyGaussWindow(Signal x, int32_t n, double sigma, int32_t symmetric) {
+template <ElementType E>
+ErrorCode ApplyGaussWindow(VectorView<E> x, double sigma, bool symmetric) {
+    const int32_t n = Count(x);
     if (n <= 1)
         return n < 1 ? ErrEmptyInput : 0;
     const double width = sigma <= 0.0 ? 0.2 : sigma;
     // kept: the periodic form counts in units of n + 1 samples
-    const double length = symmetric != 0 ? n : n + 1.0;
+    const double length = symmetric ? n : n + 1.0;
     const double c = -0.5 / (width * width * (length * length));
-    if (symmetric != 0) {
+    if (symmetric) {
         const double middle = 0.5 * (n - 1.0);
         for (int32_t i = 0; i <= (n - 1) / 2; ++i) {
             const double t = i - middle;
             const double w = std::exp(c * t * t);
-            x.scale(i, w);
+            Scale(x[i], w);
             if (i != n - 1 - i)
-                x.scale(n - 1 - i, w);
+                Scale(x[n - 1 - i], w);
         }
         return 0;
     }
-    x.scale(0, std::exp(c * n * n * 0.25));
+    Scale(x[0], std::exp(c * n * n * 0.25));
     const auto weight = [=](int32_t i) {
         const double t = i - 0.5 * n;
         return std::exp(t * (c * t));
     };
     for (int32_t i = 1; i <= (n - 1) / 2; ++i) {
         const double w = weight(i);
-        x.scale(i, w);
-        x.scale(n - i, w);
+        Scale(x[i], w);
+        Scale(x[n - i], w);
     }
     if (n % 2 == 0)
-        x.scale(n / 2, weight(n / 2));
+        Scale(x[n / 2], weight(n / 2));
     return 0;
 }
 
-template <class Signal>
-ErrorCode ApplyForceWindow(Signal x, int32_t n, double percent) {
+template <ElementType E>
+ErrorCode ApplyForceWindow(VectorView<E> x, double percent) {
+    const int32_t n = Count(x);
     if (n < 2)
         return ErrFewerThanTwo;
     for (int32_t i = SampleCount(percent * 0.01 * n, n); i < n; ++i)
-        x.clear(i);
+        Clear(x[i]);
     return 0;
 }
 
-template <class Signal>
-ErrorCode ApplyExpWindow(Signal x, int32_t n, double finalValue) {
+template <ElementType E>
+ErrorCode ApplyExpWindow(VectorView<E> x, double finalValue) {
+    const int32_t n = Count(x);
     if (n < 2)
         return ErrFewerThanTwo;
     if (finalValue <= 0.0)
@@ -214,52 +223,53 @@ ErrorCode ApplyExpWindow(Signal x, int32_t n, double finalValue) {
     const double step = std::log(finalValue) / (n - 1.0);
     double phase = 0.0;
     for (int32_t i = 0; i < n; ++i) {
-        x.scale(i, std::exp(phase));
+        Scale(x[i], std::exp(phase));
         phase += step;
     }
     return 0;
 }
 
-template <class Signal>
-ErrorCode ApplyCosTaperedWindow(Signal x, int32_t n, double taperRatio) {
+template <ElementType E>
+ErrorCode ApplyCosTaperedWindow(VectorView<E> x, double taperRatio) {
+    const int32_t n = Count(x);
     if (n < 1)
         return ErrEmptyInput;
     if (taperRatio <= 0.0 || n == 1)
         return 0;
     if (taperRatio >= 1.0) // kept: periodic, while every shorter taper is symmetric
-        return ApplyCosineWindowBySelector(x, n, 1, 0);
+        return ApplyCosineWindowBySelector(x, 1, false);
     const int32_t taper = SampleCount(taperRatio * 0.5 * n, n);
     if (taper <= 0)
         return 0;
-    x.clear(0);
-    x.clear(n - 1);
+    Clear(x[0]);
+    Clear(x[n - 1]);
     const double delta = kPi / (2.0 * taper);
     double phase = delta;
     for (int32_t i = 1; i < taper; ++i) {
         // kept: the complex form takes the phase afresh, the real form accumulates it
-        if constexpr (std::is_same_v<Signal, ComplexSignal>)
+        if constexpr (E == ElementType::CDB)
             phase = i * kPi / (2.0 * taper);
         const double sine = std::sin(phase);
-        x.scale(i, sine * sine);
-        x.scale(n - 1 - i, sine * sine);
+        Scale(x[i], sine * sine);
+        Scale(x[n - 1 - i], sine * sine);
         phase += delta;
     }
     return 0;
 }
 
-#define QX_INSTANTIATE(Signal)                                                                     \
-    template ErrorCode ApplyTriangleWindow(Signal, int32_t);                                       \
-    template ErrorCode ApplyWelchWindow(Signal, int32_t);                                          \
-    template ErrorCode ApplyBartHannWindow(Signal, int32_t);                                       \
-    template ErrorCode ApplyParzenWindow(Signal, int32_t);                                         \
-    template ErrorCode ApplyBohmanWindow(Signal, int32_t);                                         \
-    template ErrorCode ApplyKaiserWindow(Signal, int32_t, double);                                 \
-    template ErrorCode ApplyGaussWindow(Signal, int32_t, double, int32_t);                         \
-    template ErrorCode ApplyForceWindow(Signal, int32_t, double);                                  \
-    template ErrorCode ApplyExpWindow(Signal, int32_t, double);                                    \
-    template ErrorCode ApplyCosTaperedWindow(Signal, int32_t, double);
+#define QX_INSTANTIATE(Samples)                                                                    \
+    template ErrorCode ApplyTriangleWindow(Samples);                                               \
+    template ErrorCode ApplyWelchWindow(Samples);                                                  \
+    template ErrorCode ApplyBartHannWindow(Samples);                                               \
+    template ErrorCode ApplyParzenWindow(Samples);                                                 \
+    template ErrorCode ApplyBohmanWindow(Samples);                                                 \
+    template ErrorCode ApplyKaiserWindow(Samples, double);                                         \
+    template ErrorCode ApplyGaussWindow(Samples, double, bool);                                    \
+    template ErrorCode ApplyForceWindow(Samples, double);                                          \
+    template ErrorCode ApplyExpWindow(Samples, double);                                            \
+    template ErrorCode ApplyCosTaperedWindow(Samples, double);
 
-QX_INSTANTIATE(RealSignal)
-QX_INSTANTIATE(ComplexSignal)
+QX_INSTANTIATE(RealVector)
+QX_INSTANTIATE(ComplexVector)
 
 } // namespace qx

@@ -11,38 +11,38 @@ namespace qx {
 // n < 1; a single sample is left as it is, unless stated.
 
 // 2 i / n up to the middle. A single sample becomes 0.
-template <class Signal>
-ErrorCode ApplyTriangleWindow(Signal x, int32_t n);
+template <ElementType E>
+ErrorCode ApplyTriangleWindow(VectorView<E> x);
 // 1 - ((i - n/2) / (n/2))^2.
-template <class Signal>
-ErrorCode ApplyWelchWindow(Signal x, int32_t n);
+template <ElementType E>
+ErrorCode ApplyWelchWindow(VectorView<E> x);
 // 0.62 - 0.48 |i/n - 1/2| - 0.38 cos(2 pi i / n).
-template <class Signal>
-ErrorCode ApplyBartHannWindow(Signal x, int32_t n);
+template <ElementType E>
+ErrorCode ApplyBartHannWindow(VectorView<E> x);
 // With t = |i - n/2| / (n/2): 1 - 6 t^2 + 6 t^3 for t up to 1/2, 2 (1 - t)^3 beyond.
-template <class Signal>
-ErrorCode ApplyParzenWindow(Signal x, int32_t n);
+template <ElementType E>
+ErrorCode ApplyParzenWindow(VectorView<E> x);
 // sin(theta) / pi - (2 i / n) cos(theta) with theta = 2 pi i / n.
-template <class Signal>
-ErrorCode ApplyBohmanWindow(Signal x, int32_t n);
+template <ElementType E>
+ErrorCode ApplyBohmanWindow(VectorView<E> x);
 // I0(beta sqrt(1 - u^2)) / I0(beta) with u = 1 - 2 i / n and a series of I0 of its own.
-template <class Signal>
-ErrorCode ApplyKaiserWindow(Signal x, int32_t n, double beta);
+template <ElementType E>
+ErrorCode ApplyKaiserWindow(VectorView<E> x, double beta);
 // exp(-t^2 / (2 sigma^2)), t in units of n + 1 samples from the middle at n/2, or, if
-// `symmetric` is non-zero, of n samples from (n - 1)/2. A sigma of 0 or less counts as 0.2.
-template <class Signal>
-ErrorCode ApplyGaussWindow(Signal x, int32_t n, double sigma, int32_t symmetric);
+// `symmetric`, of n samples from (n - 1)/2. A sigma of 0 or less counts as 0.2.
+template <ElementType E>
+ErrorCode ApplyGaussWindow(VectorView<E> x, double sigma, bool symmetric);
 // Keeps the first `percent` per cent of the samples. ErrFewerThanTwo for n < 2.
-template <class Signal>
-ErrorCode ApplyForceWindow(Signal x, int32_t n, double percent);
+template <ElementType E>
+ErrorCode ApplyForceWindow(VectorView<E> x, double percent);
 // Falls from 1 to `finalValue` exponentially. ErrFewerThanTwo for n < 2, then
 // ErrFinalValueNotPositive.
-template <class Signal>
-ErrorCode ApplyExpWindow(Signal x, int32_t n, double finalValue);
+template <ElementType E>
+ErrorCode ApplyExpWindow(VectorView<E> x, double finalValue);
 // sin^2 tapers over `taperRatio` of the samples, half at each end, symmetric; a ratio of 1 or
 // more is the Hanning window, which is periodic.
-template <class Signal>
-ErrorCode ApplyCosTaperedWindow(Signal x, int32_t n, double taperRatio);
+template <ElementType E>
+ErrorCode ApplyCosTaperedWindow(VectorView<E> x, double taperRatio);
 
 } // namespace qx
 

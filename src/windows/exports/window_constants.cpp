@@ -8,7 +8,7 @@ namespace qx {
 namespace {
 
 ErrorCode Measured(In<DBL1D> window, OutValue<WindowConstants> constants) {
-    return MeasureWindowConstants(window.data(), window.size(), constants.address());
+    return MeasureWindowConstants(window.view(), constants.address());
 }
 
 ErrorCode ByName(int32_t n, int32_t selector, double param, OutValue<WindowConstants> constants) {

@@ -9,85 +9,82 @@
 namespace qx {
 namespace {
 
-RealSignal Samples(const InOut<DBL1D> &x) { return x.data(); }
-ComplexSignal Samples(const InOut<CDB1D> &x) { return x.data(); }
-
 // A window is its inner routine on the caller's array; the real and the complex export are the
 // same over another kind of sample.
 
 template <class Handle>
 ErrorCode Kaiser(InOut<Handle> x, double beta) {
-    return ApplyKaiserWindow(Samples(x), x.size(), beta);
+    return ApplyKaiserWindow(x.view(), beta);
 }
 
 template <class Handle>
 ErrorCode DolphChebyshev(InOut<Handle> x, double ratio, int32_t symmetric) {
-    return ApplyDolChebyWindow(Samples(x), x.size(), ratio, symmetric);
+    return ApplyDolChebyWindow(x.view(), ratio, symmetric != 0);
 }
 
 template <class Handle>
 ErrorCode Gaussian(InOut<Handle> x, double sigma, int32_t symmetric) {
-    return ApplyGaussWindow(Samples(x), x.size(), sigma, symmetric);
+    return ApplyGaussWindow(x.view(), sigma, symmetric != 0);
 }
 
 template <class Handle>
 ErrorCode Force(InOut<Handle> x, double percent) {
-    return ApplyForceWindow(Samples(x), x.size(), percent);
+    return ApplyForceWindow(x.view(), percent);
 }
 
 template <class Handle>
 ErrorCode Exponential(InOut<Handle> x, double finalValue) {
-    return ApplyExpWindow(Samples(x), x.size(), finalValue);
+    return ApplyExpWindow(x.view(), finalValue);
 }
 
 template <class Handle>
 ErrorCode CosineTapered(InOut<Handle> x, double taperRatio) {
-    return ApplyCosTaperedWindow(Samples(x), x.size(), taperRatio);
+    return ApplyCosTaperedWindow(x.view(), taperRatio);
 }
 
 template <class Handle>
 ErrorCode Triangle(InOut<Handle> x) {
-    return ApplyTriangleWindow(Samples(x), x.size());
+    return ApplyTriangleWindow(x.view());
 }
 
 template <class Handle>
 ErrorCode Welch(InOut<Handle> x) {
-    return ApplyWelchWindow(Samples(x), x.size());
+    return ApplyWelchWindow(x.view());
 }
 
 template <class Handle>
 ErrorCode BartlettHanning(InOut<Handle> x) {
-    return ApplyBartHannWindow(Samples(x), x.size());
+    return ApplyBartHannWindow(x.view());
 }
 
 template <class Handle>
 ErrorCode Bohman(InOut<Handle> x) {
-    return ApplyBohmanWindow(Samples(x), x.size());
+    return ApplyBohmanWindow(x.view());
 }
 
 template <class Handle>
 ErrorCode Parzen(InOut<Handle> x) {
-    return ApplyParzenWindow(Samples(x), x.size());
+    return ApplyParzenWindow(x.view());
 }
 
 template <class Handle>
 ErrorCode CosineSum(InOut<Handle> x, In<DBL1D> coefs) {
-    return ApplyCosineSumWindow(Samples(x), x.size(), coefs.data(), coefs.size(), 0);
+    return ApplyCosineSumWindow(x.view(), coefs.view(), false);
 }
 
 template <class Handle>
 ErrorCode ScaledCosineSum(InOut<Handle> x, In<DBL1D> coefs) {
-    return ApplyCosineSumWindow(Samples(x), x.size(), coefs.data(), coefs.size(), 1);
+    return ApplyCosineSumWindow(x.view(), coefs.view(), true);
 }
 
 template <class Handle>
 ErrorCode CosineBySelector(InOut<Handle> x, int32_t selector, int32_t scaled) {
-    return ApplyCosineWindowBySelector(Samples(x), x.size(), selector, scaled);
+    return ApplyCosineWindowBySelector(x.view(), selector, scaled != 0);
 }
 
 template <class Handle>
 ErrorCode Symmetric(InOut<Handle> x, int32_t selector, double param) {
-    return ApplySymmetricWindow(selector, Samples(x), x.size(), param);
+    return ApplySymmetricWindow(selector, x.view(), param);
 }
 
 // kept: a negative size leaves the constants alone; any other failure settles them.
@@ -95,7 +92,7 @@ template <class Handle>
 ErrorCode Scaled(InOut<Handle> x, int32_t selector, double param, WindowConstants *constants) {
     if (x.hasNegativeSize())
         return ErrNegativeDimension;
-    const ErrorCode status = ApplyScaledWindow(Samples(x), x.size(), selector, param, constants);
+    const ErrorCode status = ApplyScaledWindow(x.view(), selector, param, constants);
     if (status < 0)
         OutValue<WindowConstants>(constants).settleFailure();
     return status;
@@ -107,7 +104,7 @@ ErrorCode BySelector(InOut<Handle> x, int32_t selector, double param, int32_t sc
     // The scaled form alone tells a negative size from an empty array.
     if (scaled != 0 && symmetric == 0 && x.hasNegativeSize())
         return ErrNegativeDimension;
-    return ApplyWindowBySelector(Samples(x), x.size(), selector, param, scaled, symmetric);
+    return ApplyWindowBySelector(x.view(), selector, param, scaled != 0, symmetric != 0);
 }
 
 } // namespace
