@@ -54,6 +54,7 @@ int main() {
     std::vector<double> x(n);
     std::vector<double> other(n);
     double *y = x.data();
+    const qx::RealVector samples(y, n);
     RandomState state = {1, 2, 3};
     GaussSpare spare = {};
     double phase = 0.0;
@@ -67,15 +68,18 @@ int main() {
     Row(
         numbers, "uniform", [&] { qx::RandomUniforms(state, y, n); }, single);
     Row(
-        numbers, "Gaussian", [&] { qx::GaussianNoise(y, n, 1.0, state, spare); }, single);
+        numbers, "Gaussian", [&] { qx::GaussianNoise(samples, 1.0, state, spare); }, single);
     numbers.summary("one uniform number at a time");
 
     Ratios chains("waves by recurrence");
     Row(
-        chains, "sine", [&] { qx::GenSineWave(n, 1.0, 0.01, phase, y); }, [] { SineChain(0.01); });
+        chains, "sine", [&] { qx::GenSineWave(1.0, 0.01, phase, samples); },
+        [] { SineChain(0.01); });
     Row(
         chains, "table",
-        [&] { qx::GenArbitraryWave(n, 1.0, 0.01, phase, table.data(), 1000, 1, y); },
+        [&] {
+            qx::GenArbitraryWave(1.0, 0.01, phase, {table.data(), 1000}, 1, samples);
+        },
         [] { AdditionChain(0.01); });
     chains.summary("the chain of the recurrence");
 
@@ -85,11 +89,11 @@ int main() {
         Keep(other[0]);
     };
     Row(
-        copies, "square", [&] { qx::GenSquareWave(n, 1.0, 0.01, phase, 50.0, y); }, copy);
+        copies, "square", [&] { qx::GenSquareWave(1.0, 0.01, phase, 50.0, samples); }, copy);
     Row(
-        copies, "triangle", [&] { qx::GenTriangleWave(n, 1.0, 0.01, phase, y); }, copy);
+        copies, "triangle", [&] { qx::GenTriangleWave(1.0, 0.01, phase, samples); }, copy);
     Row(
-        copies, "sawtooth", [&] { qx::GenSawtoothWave(n, 1.0, 0.01, phase, y); }, copy);
+        copies, "sawtooth", [&] { qx::GenSawtoothWave(1.0, 0.01, phase, samples); }, copy);
     copies.summary("a copy of the array");
     return 0;
 }

@@ -2,7 +2,6 @@
 
 #include "fft/plan.h"
 #include "frame/constants.h"
-#include "frame/elements.h"
 #include "frame/scratch.h"
 #include "signal/random.h"
 #include "special/gamma.h"
@@ -13,6 +12,11 @@
 namespace qx {
 
 namespace {
+
+template <ElementType E>
+int32_t Count(VectorView<E> x) {
+    return static_cast<int32_t>(x.size());
+}
 
 // A direction by a point in the unit disc: tan(angle) = b / a.
 struct Direction {
@@ -29,11 +33,12 @@ Direction DirectionInDisc(RandomStream &stream) {
 
 } // namespace
 
-void UniformNoise(DBL *x, int32_t n, double amplitude, RandomState &state) {
+void UniformNoise(RealVector x, double amplitude, RandomState &state) {
+    const int32_t n = Count(x);
     constexpr int32_t inCache = 2048;
     for (int32_t start = 0; start < n; start += std::min(inCache, n - start)) {
         const int32_t count = std::min(inCache, n - start);
-        RandomUniforms(state, x + start, count);
+        RandomUniforms(state, &x[start], count);
         for (int32_t i = start; i < start + count; ++i)
             x[i] = (x[i] - 0.5) * (amplitude + amplitude);
     }
@@ -79,14 +84,15 @@ void FactorsOf(PolarPoints &points) {
 
 } // namespace
 
-void GaussianNoise(DBL *x, int32_t n, double sigma, RandomState &state, GaussSpare &spare) {
+void GaussianNoise(RealVector x, double sigma, RandomState &state, GaussSpare &spare) {
+    const int32_t n = Count(x);
     int32_t i = 0;
     if (spare.hasSpare != 0) {
         x[i++] = spare.spare * sigma;
         spare.hasSpare = 0;
     }
     if (RandomIsStill(state)) { // the disc would never be met
-        Fill(x + i, n - i, 0.0);
+        Fill(&x[i], n - i, 0.0);
         return;
     }
     // A point is accepted with probability pi / 4.
@@ -109,7 +115,8 @@ void GaussianNoise(DBL *x, int32_t n, double sigma, RandomState &state, GaussSpa
     }
 }
 
-ErrorCode PeriodicNoise(DBL *x, int32_t n, double amplitude, RandomState &state) {
+ErrorCode PeriodicNoise(RealVector x, double amplitude, RandomState &state) {
+    const int32_t n = Count(x);
     // In half-complex form, Re X[k] at k and Im X[k] at n - k.
     Scratch<ElementType::DBL> spectrum;
     if (const ErrorCode failed = spectrum.allocate(n))
@@ -124,7 +131,7 @@ ErrorCode PeriodicNoise(DBL *x, int32_t n, double amplitude, RandomState &state)
         spectrum[k] = magnitude * std::cos(phase);
         spectrum[n - k] = magnitude * std::sin(phase);
     }
-    return FFTRealInverse(plan.get(), spectrum.data(), x, 1, 1, n);
+    return FFTRealInverse(plan.get(), spectrum.data(), x.data(), 1, 1, n);
 }
 
 namespace {
@@ -154,7 +161,8 @@ double GammaByRejection(RandomStream &stream, double peak) {
 
 } // namespace
 
-void GammaNoise(DBL *x, int32_t n, int32_t order, RandomState &state) {
+void GammaNoise(RealVector x, int32_t order, RandomState &state) {
+    const int32_t n = Count(x);
     constexpr int32_t byRejectionFrom = 6;
     if (order < byRejectionFrom) {
         RandomStream stream(state, int64_t{n} * order);
@@ -163,7 +171,7 @@ void GammaNoise(DBL *x, int32_t n, int32_t order, RandomState &state) {
         return;
     }
     if (RandomIsStill(state)) {
-        Fill(x, n, 0.0);
+        Fill(x.data(), n, 0.0);
         return;
     }
     RandomStream stream(state, int64_t{n} * 6);
@@ -207,7 +215,8 @@ struct PoissonRejection {
 
 } // namespace
 
-void PoissonNoise(DBL *x, int32_t n, double mean, RandomState &state) {
+void PoissonNoise(RealVector x, double mean, RandomState &state) {
+    const int32_t n = Count(x);
     constexpr double byRejectionFrom = 12.0;
     if (mean < byRejectionFrom) {
         RandomStream stream(state, int64_t{n} * (static_cast<int32_t>(mean) + 1));
@@ -280,8 +289,9 @@ double BinomialByRejection(RandomStream &stream, int32_t trials, double mean,
 
 } // namespace
 
-void BinomialNoise(U32 *x, int32_t n, int32_t trials, double p, RandomState &state,
+void BinomialNoise(VectorView<ElementType::U32> x, int32_t trials, double p, RandomState &state,
                    BinomialCache &cache) {
+    const int32_t n = Count(x);
     constexpr int32_t carriedOutBelow = 25;
     const double q = p > 0.5 ? 1.0 - p : p;
     const double mean = trials * q;

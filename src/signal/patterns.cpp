@@ -1,7 +1,6 @@
 #include "signal/patterns.h"
 
 #include "frame/constants.h"
-#include "frame/elements.h"
 #include "frame/outcome.h"
 #include "mathlib/elementary.h"
 #include "signal/waves.h"
@@ -10,15 +9,17 @@
 
 namespace qx {
 
-void GenSinePattern(int32_t n, double amp, double phase, double cycles, DBL *y) {
-    GenSineWave(n, amp, cycles / n, phase, y);
+void GenSinePattern(double amp, double phase, double cycles, RealVector y) {
+    const int32_t n = Count(y);
+    GenSineWave(amp, cycles / n, phase, y);
 }
 
-ErrorCode GenSquarePattern(int32_t n, double amp, double duty, double cycles, DBL *y) {
+ErrorCode GenSquarePattern(double amp, double duty, double cycles, RealVector y) {
+    const int32_t n = Count(y);
     if (cycles > n || !(cycles > 0.0))
         return ErrWaveParameterRange;
     if (duty == 100.0) {
-        Fill(y, n, amp);
+        Fill(y.data(), n, amp);
         return 0;
     }
     // Both may exceed every integer, as they compare with places in the period they stay doubles.
@@ -34,23 +35,26 @@ ErrorCode GenSquarePattern(int32_t n, double amp, double duty, double cycles, DB
     return 0;
 }
 
-ErrorCode GenPulsePattern(int32_t n, double amp, int32_t delay, int32_t width, DBL *y) {
+ErrorCode GenPulsePattern(double amp, int32_t delay, int32_t width, RealVector y) {
+    const int32_t n = Count(y);
     if (delay < 0 || width < 0 || int64_t{delay} + width > n)
         return ErrPulseOutOfRange;
-    Fill(y, n, 0.0);
-    Fill(y + delay, width, amp);
+    Fill(y.data(), n, 0.0);
+    Fill(&y[delay], width, amp);
     return 0;
 }
 
-ErrorCode GenImpulsePattern(int32_t n, double amp, int32_t delay, DBL *y) {
+ErrorCode GenImpulsePattern(double amp, int32_t delay, RealVector y) {
+    const int32_t n = Count(y);
     if (delay < 0 || delay >= n)
         return ErrIndexOutOfRange;
-    Fill(y, n, 0.0);
+    Fill(y.data(), n, 0.0);
     y[delay] = amp;
     return 0;
 }
 
-ErrorCode GenSinc(int32_t n, double amp, double delay, double dt, DBL *y) {
+ErrorCode GenSinc(double amp, double delay, double dt, RealVector y) {
+    const int32_t n = Count(y);
     if (!(dt > 0.0))
         return ErrSamplingNotPositive;
     for (int32_t i = 0; i < n; ++i) {
@@ -60,7 +64,8 @@ ErrorCode GenSinc(int32_t n, double amp, double delay, double dt, DBL *y) {
     return 0;
 }
 
-ErrorCode GenRamp(int32_t n, double start, double end, int32_t excludeEnd, DBL *y, int32_t scale) {
+ErrorCode GenRamp(double start, double end, int32_t excludeEnd, RealVector y, int32_t scale) {
+    const int32_t n = Count(y);
     const double divider = excludeEnd == 0 ? n - 1.0 : n;
     if (scale == 1) {
         if (!(start > 0.0) || !(end > 0.0))
@@ -84,57 +89,55 @@ namespace {
 
 // y becomes shape(t) at the times of the grid.
 template <class Shape>
-void Evaluate(int32_t n, const TimeGrid &grid, DBL *y, const Shape &shape) {
+void Evaluate(const TimeGrid &grid, RealVector y, const Shape &shape) {
+    const int32_t n = Count(y);
     for (int32_t i = 0; i < n; ++i)
         y[i] = shape(grid.at(y, i));
 }
 
 // The checks that all pulses share, around those of their own parameters.
-ErrorCode CheckPulse(int32_t n, const TimeGrid &grid, bool parametersArePositive) {
+ErrorCode CheckPulse(const TimeGrid &grid, bool parametersArePositive) {
     return FirstFailed({{!parametersArePositive, ErrNotStrictlyPositive},
-                        {n < 1, ErrEmptyInput},
                         {!(grid.dt > 0.0), ErrSamplingNotPositive}});
 }
 
 } // namespace
 
-ErrorCode GenGaussPulse(int32_t n, double amp, const TimeGrid &grid, double fc, double bandwidth,
-                        double dBReference, DBL *y) {
+ErrorCode GenGaussPulse(double amp, const TimeGrid &grid, double fc, double bandwidth,
+                        double dBReference, RealVector y) {
     const bool arePositive = fc > 0.0 && bandwidth > 0.0 && dBReference > 0.0;
-    if (const ErrorCode bad = CheckPulse(n, grid, arePositive))
+    if (const ErrorCode bad = CheckPulse(grid, arePositive))
         return bad;
     constexpr double ln10 = 2.302585092994046;
     const double c = bandwidth * (-5.0 * bandwidth) / ln10 / dBReference;
-    Evaluate(n, grid, y, [=](double t) {
+    Evaluate(grid, y, [=](double t) {
         const double u = t * kPi * fc;
         return amp * std::exp(u * u * c) * std::cos(2.0 * u);
     });
     return 0;
 }
 
-ErrorCode GenGaussMonopulse(int32_t n, double amp, const TimeGrid &grid, double fc, DBL *y) {
-    if (const ErrorCode bad = CheckPulse(n, grid, fc > 0.0))
+ErrorCode GenGaussMonopulse(double amp, const TimeGrid &grid, double fc, RealVector y) {
+    if (const ErrorCode bad = CheckPulse(grid, fc > 0.0))
         return bad;
     const double height = 2.0 * amp * std::sqrt(2.718281828459045);
-    Evaluate(n, grid, y, [=](double t) {
+    Evaluate(grid, y, [=](double t) {
         const double u = t * kPi * fc;
         return height * u * std::exp(-2.0 * u * u);
     });
     return 0;
 }
 
-ErrorCode GenAperiodicTriangle(int32_t n, double amp, const TimeGrid &grid, double width,
-                               double skew, DBL *y) {
-    if (n < 1)
-        return ErrEmptyInput;
-    if (const ErrorCode bad = CheckPulse(n, grid, width > 0.0))
+ErrorCode GenAperiodicTriangle(double amp, const TimeGrid &grid, double width, double skew,
+                               RealVector y) {
+    if (const ErrorCode bad = CheckPulse(grid, width > 0.0))
         return bad;
     if (skew < 0.0 || skew > 1.0)
         return ErrProbabilityOutOfRange;
     // kept: times of the caller's are shifted by half a width, the uniform ones are not.
     const double shift = grid.isUniform ? 0.0 : 0.5 * width;
     const double top = skew * width;
-    Evaluate(n, grid, y, [=](double time) {
+    Evaluate(grid, y, [=](double time) {
         const double t = time + shift;
         if (t < 0.0 || t > width)
             return 0.0;
@@ -147,10 +150,10 @@ ErrorCode GenAperiodicTriangle(int32_t n, double amp, const TimeGrid &grid, doub
     return 0;
 }
 
-ErrorCode GenPeriodicSinc(int32_t n, double amp, const TimeGrid &grid, int32_t order, DBL *y) {
-    if (const ErrorCode bad = CheckPulse(n, grid, order >= 1))
+ErrorCode GenPeriodicSinc(double amp, const TimeGrid &grid, int32_t order, RealVector y) {
+    if (const ErrorCode bad = CheckPulse(grid, order >= 1))
         return bad;
-    Evaluate(n, grid, y, [=](double t) {
+    Evaluate(grid, y, [=](double t) {
         const double x = 0.5 * t;
         const double sine = std::sin(x);
         if (!(std::fabs(sine) > 2.220446049250313e-16)) {
@@ -181,7 +184,8 @@ double Degrees(double phase, double dt) { return phase * dt * 180.0 / kPi; }
 
 } // namespace
 
-double ModulatePhase(int32_t n, double dt, double fc, DBL *y, double &peak, double &phase) {
+double ModulatePhase(double dt, double fc, RealVector y, double &peak, double &phase) {
+    const int32_t n = Count(y);
     const double limit = 2.0 * kPi / dt;
     const double step = 2.0 * kPi * fc;
     for (int32_t i = 0; i < n; ++i) {
@@ -189,12 +193,13 @@ double ModulatePhase(int32_t n, double dt, double fc, DBL *y, double &peak, doub
         phase = Wrapped(phase + step, limit);
         y[i] = y[i] * kPi / 180.0 + phase * dt;
     }
-    Sines(y, n, y);
+    Sines(y.data(), n, y.data());
     // kept: the last output, a sine, is added to degrees.
     return Degrees(phase, dt) + (n > 0 ? static_cast<double>(y[n - 1]) : 0.0);
 }
 
-double ModulateFrequency(int32_t n, double dt, double fc, DBL *y, double &peak, double &phase) {
+double ModulateFrequency(double dt, double fc, RealVector y, double &peak, double &phase) {
+    const int32_t n = Count(y);
     const double limit = 2.0 * kPi / dt;
     const double step = 2.0 * kPi * fc;
     for (int32_t i = 0; i < n; ++i) {
@@ -202,7 +207,7 @@ double ModulateFrequency(int32_t n, double dt, double fc, DBL *y, double &peak, 
         phase = Wrapped(y[i] * 2.0 * kPi + step + phase, limit);
         y[i] = phase * dt;
     }
-    Sines(y, n, y);
+    Sines(y.data(), n, y.data());
     return Degrees(phase, dt);
 }
 

@@ -1,46 +1,46 @@
 #ifndef QX_SIGNAL_PATTERNS_H
 #define QX_SIGNAL_PATTERNS_H
 
+#include "frame/views.h"
 #include "qx/errors.h"
-#include "qx/types.h"
 
 namespace qx {
 
-// Patterns of n samples, n >= 1; the codes come before anything is written.
+// Patterns of n samples, n >= 1, the size of y; the codes come before anything is written.
 
-void GenSinePattern(int32_t n, double amp, double phase, double cycles, DBL *y);
+void GenSinePattern(double amp, double phase, double cycles, RealVector y);
 // ErrWaveParameterRange: cycles is not above 0 or exceeds n.
-ErrorCode GenSquarePattern(int32_t n, double amp, double duty, double cycles, DBL *y);
+ErrorCode GenSquarePattern(double amp, double duty, double cycles, RealVector y);
 // ErrPulseOutOfRange.
-ErrorCode GenPulsePattern(int32_t n, double amp, int32_t delay, int32_t width, DBL *y);
+ErrorCode GenPulsePattern(double amp, int32_t delay, int32_t width, RealVector y);
 // ErrIndexOutOfRange.
-ErrorCode GenImpulsePattern(int32_t n, double amp, int32_t delay, DBL *y);
+ErrorCode GenImpulsePattern(double amp, int32_t delay, RealVector y);
 // ErrSamplingNotPositive.
-ErrorCode GenSinc(int32_t n, double amp, double delay, double dt, DBL *y);
+ErrorCode GenSinc(double amp, double delay, double dt, RealVector y);
 // From start to end, which is sample n - 1, or with excludeEnd sample n; scale 1 in equal ratios.
 // ErrNotStrictlyPositive.
-ErrorCode GenRamp(int32_t n, double start, double end, int32_t excludeEnd, DBL *y, int32_t scale);
+ErrorCode GenRamp(double start, double end, int32_t excludeEnd, RealVector y, int32_t scale);
 
-// Where a pulse is evaluated: at i dt - delay, or at the times that stand in the output.
+// Where a pulse is evaluated: at i dt - delay, or at the times that are in the output.
 struct TimeGrid {
     bool isUniform;
     double dt;
     double delay;
-    double at(const DBL *y, int32_t i) const {
+    double at(ConstRealVector y, int32_t i) const {
         return isUniform ? i * dt - delay : static_cast<double>(y[i]);
     }
 };
-ErrorCode GenGaussPulse(int32_t n, double amp, const TimeGrid &grid, double fc, double bandwidth,
-                        double dBReference, DBL *y);
-ErrorCode GenGaussMonopulse(int32_t n, double amp, const TimeGrid &grid, double fc, DBL *y);
-ErrorCode GenAperiodicTriangle(int32_t n, double amp, const TimeGrid &grid, double width,
-                               double skew, DBL *y);
-ErrorCode GenPeriodicSinc(int32_t n, double amp, const TimeGrid &grid, int32_t order, DBL *y);
+ErrorCode GenGaussPulse(double amp, const TimeGrid &grid, double fc, double bandwidth,
+                        double dBReference, RealVector y);
+ErrorCode GenGaussMonopulse(double amp, const TimeGrid &grid, double fc, RealVector y);
+ErrorCode GenAperiodicTriangle(double amp, const TimeGrid &grid, double width, double skew,
+                               RealVector y);
+ErrorCode GenPeriodicSinc(double amp, const TimeGrid &grid, int32_t order, RealVector y);
 
 // Modulators: y is the modulating signal and becomes the output. `peak` and `phase` are in and out;
 // the result is the carrier's phase in degrees.
-double ModulatePhase(int32_t n, double dt, double fc, DBL *y, double &peak, double &phase);
-double ModulateFrequency(int32_t n, double dt, double fc, DBL *y, double &peak, double &phase);
+double ModulatePhase(double dt, double fc, RealVector y, double &peak, double &phase);
+double ModulateFrequency(double dt, double fc, RealVector y, double &peak, double &phase);
 
 } // namespace qx
 

@@ -1,7 +1,6 @@
 #include "signal/waves.h"
 
 #include "frame/constants.h"
-#include "frame/elements.h"
 #include "mathlib/elementary.h"
 
 #include <algorithm>
@@ -22,38 +21,43 @@ double PhaseAt(int32_t i, double f, double start) {
 
 // `samples` makes the wave of its phases. Phases too large for its remainder are made here.
 template <class Samples>
-void GenShapedWave(int32_t n, double f, double &phase, DBL *y, const Samples &samples) {
+void GenShapedWave(double f, double &phase, RealVector y, const Samples &samples) {
+    const int32_t n = Count(y);
     const double reach = std::fabs(phase) + std::fabs(n * 360.0 * f);
     WavePhases phases = {f, phase, !(reach < 0x1p50)};
     if (phases.inPlace)
         for (int32_t i = 0; i < n; ++i)
             y[i] = PhaseAt(i, f, phase);
-    samples(phases);
+    samples(phases, n);
     phase = PhaseAt(n, f, phase);
 }
 
 } // namespace
 
-void GenSquareWave(int32_t n, double amp, double f, double &phase, double duty, DBL *y) {
+void GenSquareWave(double amp, double f, double &phase, double duty, RealVector y) {
     const double threshold = 3.6 * std::min(std::max(duty, 0.0), 100.0);
-    GenShapedWave(n, f, phase, y,
-                  [&](const WavePhases &phases) { SquareSamples(phases, n, amp, threshold, y); });
+    GenShapedWave(f, phase, y, [&](const WavePhases &phases, int32_t n) {
+        SquareSamples(phases, n, amp, threshold, y.data());
+    });
 }
 
-void GenTriangleWave(int32_t n, double amp, double f, double &phase, DBL *y) {
-    GenShapedWave(n, f, phase, y,
-                  [&](const WavePhases &phases) { TriangleSamples(phases, n, amp, y); });
+void GenTriangleWave(double amp, double f, double &phase, RealVector y) {
+    GenShapedWave(f, phase, y, [&](const WavePhases &phases, int32_t n) {
+        TriangleSamples(phases, n, amp, y.data());
+    });
 }
 
-void GenSawtoothWave(int32_t n, double amp, double f, double &phase, DBL *y) {
-    GenShapedWave(n, f, phase, y,
-                  [&](const WavePhases &phases) { SawtoothSamples(phases, n, amp, y); });
+void GenSawtoothWave(double amp, double f, double &phase, RealVector y) {
+    GenShapedWave(f, phase, y, [&](const WavePhases &phases, int32_t n) {
+        SawtoothSamples(phases, n, amp, y.data());
+    });
 }
 
 // Sine and cosine two samples apart: sin(a + 2w) = sin(a) + 2 sin(w) cos(a + w), and likewise for
 // the cosine. Clipping is part of the method, whose amplitude is not stable over long runs; as it
 // is rare, a branch takes it off the chain of additions.
-void GenSineWave(int32_t n, double amp, double f, double &phase, DBL *y) {
+void GenSineWave(double amp, double f, double &phase, RealVector y) {
+    const int32_t n = Count(y);
     const double w = 2.0 * kPi * f;
     const double a = phase * 0.017453292519943295;
     const double k = 2.0 * std::sin(w);
@@ -90,7 +94,8 @@ double ReducedByWhole(double q, double m, double inverse) {
 }
 
 template <class Value>
-double ReadTable(int32_t n, double position, double step, double m, DBL *y, const Value &value) {
+double ReadTable(double position, double step, double m, RealVector y, const Value &value) {
+    const int32_t n = Count(y);
     const bool isNear = std::fabs(position) + std::fabs(n * step) < 0x1p44;
     const double inverse = 1.0 / m;
     for (int32_t i = 0; i < n; ++i) {
@@ -106,12 +111,13 @@ double ReadTable(int32_t n, double position, double step, double m, DBL *y, cons
 
 } // namespace
 
-ErrorCode GenArbitraryWave(int32_t n, double amp, double f, double &phase, const DBL *table,
-                           int32_t m, int32_t interpolate, DBL *y) {
+ErrorCode GenArbitraryWave(double amp, double f, double &phase, ConstRealVector table,
+                           int32_t interpolate, RealVector y) {
+    const int32_t n = Count(y), m = Count(table);
     if (!std::isfinite(phase) || !std::isfinite(f))
         return ErrNonFiniteInput;
     if (m < 1) {
-        Fill(y, n, amp * 0.0);
+        Fill(y.data(), n, amp * 0.0);
         phase = 0.0;
         return 0;
     }
@@ -122,24 +128,25 @@ ErrorCode GenArbitraryWave(int32_t n, double amp, double f, double &phase, const
     if (!std::isfinite(2.0 * (std::fabs(position) + n * std::fabs(step))))
         return ErrNonFiniteInput;
     if (interpolate == 1)
-        position = ReadTable(n, position, step, length, y, [=](double r) {
+        position = ReadTable(position, step, length, y, [=](double r) {
             const auto i = static_cast<int32_t>(r);
             const double before = table[i];
             const double behind = table[i + 1 < m ? i + 1 : 0];
             return amp * (before + (r - i) * (behind - before));
         });
     else
-        position = ReadTable(n, position, step, length, y,
+        position = ReadTable(position, step, length, y,
                              [=](double r) { return amp * table[static_cast<int32_t>(r)]; });
     phase = Raised(std::fmod(360.0 / length * position, 360.0), 360.0);
     return 0;
 }
 
-void GenChirp(int32_t n, double amp, double f1, double f2, DBL *y) {
+void GenChirp(double amp, double f1, double f2, RealVector y) {
+    const int32_t n = Count(y);
     const double step = (f2 - f1) * kPi / n;
     for (int32_t i = 0; i < n; ++i)
         y[i] = i * (step * i + 2.0 * kPi * f1);
-    Sines(y, n, y);
+    Sines(y.data(), n, y.data());
     for (int32_t i = 0; i < n; ++i)
         y[i] = amp * y[i];
 }

@@ -1,24 +1,27 @@
 #ifndef QX_SIGNAL_WAVES_H
 #define QX_SIGNAL_WAVES_H
 
+#include "frame/views.h"
 #include "frame/widths.h"
 #include "qx/errors.h"
-#include "qx/types.h"
 
 namespace qx {
 
-// Continuous waves of n samples, n >= 1: f in cycles per sample, `phase` in degrees, in and out.
-void GenSineWave(int32_t n, double amp, double f, double &phase, DBL *y);
-void GenSquareWave(int32_t n, double amp, double f, double &phase, double duty, DBL *y);
-void GenTriangleWave(int32_t n, double amp, double f, double &phase, DBL *y);
-void GenSawtoothWave(int32_t n, double amp, double f, double &phase, DBL *y);
-// m values of a table; ErrNonFiniteInput before anything is written.
-ErrorCode GenArbitraryWave(int32_t n, double amp, double f, double &phase, const DBL *table,
-                           int32_t m, int32_t interpolate, DBL *y);
-void GenChirp(int32_t n, double amp, double f1, double f2, DBL *y);
+inline int32_t Count(ConstRealVector y) { return static_cast<int32_t>(y.size()); }
+
+// Continuous waves of n samples, n >= 1, the size of y: f in cycles per sample, `phase` in degrees,
+// in and out.
+void GenSineWave(double amp, double f, double &phase, RealVector y);
+void GenSquareWave(double amp, double f, double &phase, double duty, RealVector y);
+void GenTriangleWave(double amp, double f, double &phase, RealVector y);
+void GenSawtoothWave(double amp, double f, double &phase, RealVector y);
+// By the values of a table. ErrNonFiniteInput before anything is written.
+ErrorCode GenArbitraryWave(double amp, double f, double &phase, ConstRealVector table,
+                           int32_t interpolate, RealVector y);
+void GenChirp(double amp, double f1, double f2, RealVector y);
 
 // The phases of a wave: fmod(i 360 f + start, 360), raised by 360 where negative; or, `inPlace`,
-// what stands in the output, for where the lanes' own remainder is not exact.
+// what is in the output, for where the lanes' own remainder is not exact.
 struct WavePhases {
     double f;
     double start;

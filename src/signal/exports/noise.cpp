@@ -17,7 +17,7 @@ Outcome White(Out<DBL1D> x, int32_t n, double amplitude, int32_t seed, RandomSta
     if (const Outcome bad = x.resize(n))
         return bad;
     SeedUnlessNegative(seed, *state);
-    UniformNoise(x.data(), n, amplitude, *state);
+    UniformNoise(x.view(), amplitude, *state);
     return 0;
 }
 
@@ -32,7 +32,7 @@ Outcome Gaussian(Out<DBL1D> x, int32_t n, double sigma, int32_t seed, RandomStat
         spare->hasSpare = 0; // member by member: what lies between them stays
         spare->spare = 0.0;
     }
-    GaussianNoise(x.data(), n, sigma, *state, *spare);
+    GaussianNoise(x.view(), sigma, *state, *spare);
     return 0;
 }
 
@@ -42,7 +42,7 @@ Outcome Periodic(int32_t n, double amplitude, int32_t seed, Out<DBL1D> x, Random
     if (const Outcome bad = x.resize(n))
         return bad;
     SeedUnlessNegative(seed, *state);
-    return PeriodicNoise(x.data(), n, amplitude, *state);
+    return PeriodicNoise(x.view(), amplitude, *state);
 }
 
 // The frame of those whose parameters are checked ahead of the count.
@@ -60,19 +60,18 @@ Outcome Checked(Array &x, int32_t n, bool parametersAreGood, int32_t seed, Rando
 }
 
 Outcome Gamma(Out<DBL1D> x, int32_t n, int32_t order, int32_t seed, RandomState *state) {
-    return Checked(x, n, order >= 1, seed, state, [&] { GammaNoise(x.data(), n, order, *state); });
+    return Checked(x, n, order >= 1, seed, state, [&] { GammaNoise(x.view(), order, *state); });
 }
 
 Outcome Poisson(Out<DBL1D> x, int32_t n, double mean, int32_t seed, RandomState *state) {
-    return Checked(x, n, !(mean < 0.0), seed, state,
-                   [&] { PoissonNoise(x.data(), n, mean, *state); });
+    return Checked(x, n, !(mean < 0.0), seed, state, [&] { PoissonNoise(x.view(), mean, *state); });
 }
 
 // A probability that is NaN would never be accepted.
 Outcome Binomial(Out<U32_1D> x, int32_t n, int32_t trials, double p, int32_t seed,
                  RandomState *state, BinomialCache *cache) {
     return Checked(x, n, trials >= 0 && p >= 0.0 && p <= 1.0, seed, state,
-                   [&] { BinomialNoise(x.data(), n, trials, p, *state, *cache); });
+                   [&] { BinomialNoise(x.view(), trials, p, *state, *cache); });
 }
 
 } // namespace

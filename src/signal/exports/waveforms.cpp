@@ -3,10 +3,12 @@
 #include "signal/patterns.h"
 #include "signal/waves.h"
 
+#include <algorithm>
+
 namespace qx {
 namespace {
 
-// The frame of all with an error out-parameter: n samples that `generate(n, samples)` makes, after
+// The frame of all with an error out-parameter: n samples that `generate(samples)` makes, after
 // a check of its own where the samples are not made for a wrong argument.
 template <class Generate>
 Outcome Samples(Out<DBL1D> &x, int32_t n, ErrorCode badArgument, const Generate &generate) {
@@ -14,14 +16,14 @@ Outcome Samples(Out<DBL1D> &x, int32_t n, ErrorCode badArgument, const Generate 
         return bad;
     if (const Outcome bad = x.resize(n))
         return bad;
-    return generate(n, x.data());
+    return generate(x.view());
 }
 
 template <class Generate>
 int32_t Wave(DBL1D x, const int32_t *n, ErrorCode *err, const Generate &generate) {
     const auto body = [&](Out<DBL1D> samples, int32_t count) {
-        return Samples(samples, count, 0, [&](int32_t size, DBL *y) {
-            generate(size, y);
+        return Samples(samples, count, 0, [&](RealVector y) {
+            generate(y);
             return 0;
         });
     };
@@ -38,8 +40,8 @@ int32_t Pattern(DBL1D x, const int32_t *n, ErrorCode *err, const Generate &gener
 
 Outcome Arbitrary(Out<DBL1D> x, int32_t n, double amp, double f, double *phase, In<DBL1D> table,
                   int32_t interpolate) {
-    return Samples(x, n, 0, [&](int32_t size, DBL *y) {
-        return GenArbitraryWave(size, amp, f, *phase, table.data(), table.size(), interpolate, y);
+    return Samples(x, n, 0, [&](RealVector y) {
+        return GenArbitraryWave(amp, f, *phase, table.view(), interpolate, y);
     });
 }
 
@@ -47,9 +49,8 @@ Outcome SquarePattern(Out<DBL1D> x, int32_t n, double amp, double duty, double c
     const ErrorCode badArgument =
         FirstFailed({{!(duty > 0.0), ErrWaveParameterNotPositive},
                      {cycles > n / 2 || !(cycles > 0.0), ErrWaveParameterRange}});
-    return Samples(x, n, badArgument, [&](int32_t size, DBL *y) {
-        return GenSquarePattern(size, amp, duty, cycles, y);
-    });
+    return Samples(x, n, badArgument,
+                   [&](RealVector y) { return GenSquarePattern(amp, duty, cycles, y); });
 }
 
 // An excludeEnd other than 0 and 1 counts as 1 throughout.
@@ -62,7 +63,7 @@ ErrorCode CheckRamp(int32_t n, double start, double end, int32_t excludeEnd, int
 
 Outcome RampByReference(Out<DBL1D> x, int32_t n, double start, double end) {
     return Samples(x, n, CheckRamp(n, start, end, 0, 0),
-                   [&](int32_t size, DBL *y) { return GenRamp(size, start, end, 0, y, 0); });
+                   [&](RealVector y) { return GenRamp(start, end, 0, y, 0); });
 }
 
 Outcome Ramp(Out<DBL1D> x, int32_t n, double start, double end, int32_t excludeEnd, int32_t scale) {
@@ -70,8 +71,11 @@ Outcome Ramp(Out<DBL1D> x, int32_t n, double start, double end, int32_t excludeE
         return bad;
     if (const Outcome bad = x.resize(n))
         return bad;
-    return GenRamp(n, start, end, excludeEnd, x.data(), scale);
+    return GenRamp(start, end, excludeEnd, x.view(), scale);
 }
+
+// The samples of a caller that gives no array; none where n is negative.
+RealVector Given(DBL *y, int32_t n) { return {y, std::max(n, 0)}; }
 
 // The times of a pulse are its array's content or, if that is empty, n uniform ones.
 template <class Generate>
@@ -84,7 +88,7 @@ ErrorCode Pulse(DBL1D x, int32_t n, double dt, double delay, const Generate &gen
             if (const Outcome bad = samples.resize(n))
                 return bad;
         }
-        return generate(samples.size(), TimeGrid{isUniform, dt, delay}, samples.data());
+        return generate(TimeGrid{isUniform, dt, delay}, samples.view());
     };
     return Returned(body, x);
 }
@@ -97,27 +101,23 @@ using qx::Returned;
 
 int32_t SineWaveCIN(DBL1D x, const int32_t *n, const double *amp, const double *f, double *phase,
                     ErrorCode *err) {
-    return qx::Wave(x, n, err,
-                    [=](int32_t size, DBL *y) { qx::GenSineWave(size, *amp, *f, *phase, y); });
+    return qx::Wave(x, n, err, [=](qx::RealVector y) { qx::GenSineWave(*amp, *f, *phase, y); });
 }
 
 int32_t SquareWaveCIN(DBL1D x, const int32_t *n, const double *amp, const double *f, double *phase,
                       const double *duty, ErrorCode *err) {
-    return qx::Wave(x, n, err, [=](int32_t size, DBL *y) {
-        qx::GenSquareWave(size, *amp, *f, *phase, *duty, y);
-    });
+    return qx::Wave(x, n, err,
+                    [=](qx::RealVector y) { qx::GenSquareWave(*amp, *f, *phase, *duty, y); });
 }
 
 int32_t TriangleWaveCIN(DBL1D x, const int32_t *n, const double *amp, const double *f,
                         double *phase, ErrorCode *err) {
-    return qx::Wave(x, n, err,
-                    [=](int32_t size, DBL *y) { qx::GenTriangleWave(size, *amp, *f, *phase, y); });
+    return qx::Wave(x, n, err, [=](qx::RealVector y) { qx::GenTriangleWave(*amp, *f, *phase, y); });
 }
 
 int32_t SawtoothWaveCIN(DBL1D x, const int32_t *n, const double *amp, const double *f,
                         double *phase, ErrorCode *err) {
-    return qx::Wave(x, n, err,
-                    [=](int32_t size, DBL *y) { qx::GenSawtoothWave(size, *amp, *f, *phase, y); });
+    return qx::Wave(x, n, err, [=](qx::RealVector y) { qx::GenSawtoothWave(*amp, *f, *phase, y); });
 }
 
 int32_t ArbitraryWaveCIN(DBL1D x, const int32_t *n, const double *amp, const double *f,
@@ -127,15 +127,13 @@ int32_t ArbitraryWaveCIN(DBL1D x, const int32_t *n, const double *amp, const dou
 
 int32_t ChirpCIN(DBL1D x, const int32_t *n, const double *amp, const double *f1, const double *f2,
                  ErrorCode *err) {
-    return qx::Wave(x, n, err,
-                    [=](int32_t size, DBL *y) { qx::GenChirp(size, *amp, *f1, *f2, y); });
+    return qx::Wave(x, n, err, [=](qx::RealVector y) { qx::GenChirp(*amp, *f1, *f2, y); });
 }
 
 int32_t SinePtrn(DBL1D x, const int32_t *n, const double *amp, const double *phase,
                  const double *cycles, ErrorCode *err) {
-    return qx::Wave(x, n, err, [=](int32_t size, DBL *y) {
-        qx::GenSinePattern(size, *amp, *phase, *cycles, y);
-    });
+    return qx::Wave(x, n, err,
+                    [=](qx::RealVector y) { qx::GenSinePattern(*amp, *phase, *cycles, y); });
 }
 
 int32_t Square(DBL1D x, const int32_t *n, const double *amp, const double *duty,
@@ -145,22 +143,20 @@ int32_t Square(DBL1D x, const int32_t *n, const double *amp, const double *duty,
 
 int32_t PulsePtrn(DBL1D x, const int32_t *n, const double *amp, const int32_t *delay,
                   const int32_t *width, ErrorCode *err) {
-    return qx::Pattern(x, n, err, [=](int32_t size, DBL *y) {
-        return qx::GenPulsePattern(size, *amp, *delay, *width, y);
-    });
+    return qx::Pattern(
+        x, n, err, [=](qx::RealVector y) { return qx::GenPulsePattern(*amp, *delay, *width, y); });
 }
 
 int32_t ImpulsePtrn(DBL1D x, const int32_t *n, const double *amp, const int32_t *delay,
                     ErrorCode *err) {
-    return qx::Pattern(x, n, err, [=](int32_t size, DBL *y) {
-        return qx::GenImpulsePattern(size, *amp, *delay, y);
-    });
+    return qx::Pattern(x, n, err,
+                       [=](qx::RealVector y) { return qx::GenImpulsePattern(*amp, *delay, y); });
 }
 
 int32_t SincWave(DBL1D x, const int32_t *n, const double *amp, const double *delay,
                  const double *dt, ErrorCode *err) {
-    return qx::Pattern(
-        x, n, err, [=](int32_t size, DBL *y) { return qx::GenSinc(size, *amp, *delay, *dt, y); });
+    return qx::Pattern(x, n, err,
+                       [=](qx::RealVector y) { return qx::GenSinc(*amp, *delay, *dt, y); });
 }
 
 int32_t RampPtrn(DBL1D x, const int32_t *n, const double *start, const double *end,
@@ -179,38 +175,38 @@ ErrorCode RampPtrn85(DBL1D x, int32_t n, double start, double end, int32_t exclu
 
 ErrorCode GaussPulseH(DBL1D x, int32_t n, double amp, double delay, double dt, double fc,
                       double bandwidth, double dBReference) {
-    return qx::Pulse(x, n, dt, delay, [=](int32_t size, const qx::TimeGrid &grid, DBL *y) {
-        return qx::GenGaussPulse(size, amp, grid, fc, bandwidth, dBReference, y);
+    return qx::Pulse(x, n, dt, delay, [=](const qx::TimeGrid &grid, qx::RealVector y) {
+        return qx::GenGaussPulse(amp, grid, fc, bandwidth, dBReference, y);
     });
 }
 
 ErrorCode GaussMonopulseH(DBL1D x, int32_t n, double dt, double delay, double fc, double amp) {
-    return qx::Pulse(x, n, dt, delay, [=](int32_t size, const qx::TimeGrid &grid, DBL *y) {
-        return qx::GenGaussMonopulse(size, amp, grid, fc, y);
+    return qx::Pulse(x, n, dt, delay, [=](const qx::TimeGrid &grid, qx::RealVector y) {
+        return qx::GenGaussMonopulse(amp, grid, fc, y);
     });
 }
 
 ErrorCode AperiodTriangleH(DBL1D x, int32_t n, double amp, double delay, double dt, double width,
                            double skew) {
-    return qx::Pulse(x, n, dt, delay, [=](int32_t size, const qx::TimeGrid &grid, DBL *y) {
-        return qx::GenAperiodicTriangle(size, amp, grid, width, skew, y);
+    return qx::Pulse(x, n, dt, delay, [=](const qx::TimeGrid &grid, qx::RealVector y) {
+        return qx::GenAperiodicTriangle(amp, grid, width, skew, y);
     });
 }
 
 ErrorCode PeriodicSincH(DBL1D x, int32_t n, double amp, int32_t order, double dt, double delay) {
-    return qx::Pulse(x, n, dt, delay, [=](int32_t size, const qx::TimeGrid &grid, DBL *y) {
-        return qx::GenPeriodicSinc(size, amp, grid, order, y);
+    return qx::Pulse(x, n, dt, delay, [=](const qx::TimeGrid &grid, qx::RealVector y) {
+        return qx::GenPeriodicSinc(amp, grid, order, y);
     });
 }
 
 int32_t PhasMod(int32_t n, double dt, double *phaseOut, double fc, DBL *y, double *peak,
                 double *phase) {
-    *phaseOut = qx::ModulatePhase(n, dt, fc, y, *peak, *phase);
+    *phaseOut = qx::ModulatePhase(dt, fc, qx::Given(y, n), *peak, *phase);
     return 0;
 }
 
 int32_t FreqMod(int32_t n, double dt, double *phaseOut, double fc, DBL *y, double *peak,
                 double *phase) {
-    *phaseOut = qx::ModulateFrequency(n, dt, fc, y, *peak, *phase);
+    *phaseOut = qx::ModulateFrequency(dt, fc, qx::Given(y, n), *peak, *phase);
     return 0;
 }

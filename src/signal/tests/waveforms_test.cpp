@@ -274,7 +274,7 @@ TEST(Patterns, SquareRoundsItsPeriodAndItsDuty) {
     Pattern(ErrWaveParameterRange, Square, 8, 2.0, 50.0, nan);
     Pattern(ErrWaveParameterRange, Square, 9, 2.0, 50.0, 4.25);
     double y[2];
-    EXPECT_EQ(qx::GenSquarePattern(2, 1.0, 50.0, 2.5, y), ErrWaveParameterRange);
+    EXPECT_EQ(qx::GenSquarePattern(1.0, 50.0, 2.5, {y, 2}), ErrWaveParameterRange);
 }
 
 TEST(Patterns, PulsesStandWhereTheyAreAsked) {
