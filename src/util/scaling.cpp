@@ -6,45 +6,44 @@
 
 namespace qx {
 
-void ScaleToUnitRange(DBL *x, int32_t n, double &scale, double &offset) {
-    const Range range = RangeOf(x, n);
+namespace {
+int32_t Count(RealVector x) { return static_cast<int32_t>(x.size()); }
+} // namespace
+
+void ScaleToUnitRange(RealVector x, double &scale, double &offset) {
+    const Range range = RangeOf(x.data(), Count(x));
     if (range.highest < range.lowest) { // nothing but NaN
         scale = offset = kNaN;
         return;
     }
     scale = (range.highest - range.lowest) * 0.5;
     offset = range.lowest + scale;
-    if (std::isfinite(1.0 / scale)) {
-        ShiftAndMultiply(x, n, offset, 1.0 / scale);
-    } else {
+    if (!std::isfinite(1.0 / scale))
         scale = 1.0;
-        ShiftAndMultiply(x, n, offset, 1.0);
-    }
+    ShiftAndMultiply(x.data(), Count(x), offset, 1.0 / scale);
 }
 
-void ScaleByMagnitude(DBL *x, int32_t n, double &scale) {
-    scale = LargestMagnitude(x, n);
+void ScaleByMagnitude(RealVector x, double &scale) {
+    scale = LargestMagnitude(x.data(), Count(x));
     if (scale > 0.0)
-        ShiftAndMultiply(x, n, 0.0, 1.0 / scale);
+        ShiftAndMultiply(x.data(), Count(x), 0.0, 1.0 / scale);
 }
 
-void Standardise(DBL *x, int32_t n, double &mean, double &deviation) {
-    mean = SumOf(x, n) / n;
-    deviation = std::sqrt(SumOfSquares(x, n, mean) / n);
-    ShiftAndMultiply(x, n, mean, 1.0 / deviation);
+void Standardise(RealVector x, double &mean, double &deviation) {
+    const int32_t n = Count(x);
+    mean = SumOf(x.data(), n) / n;
+    deviation = std::sqrt(SumOfSquares(x.data(), n, mean) / n);
+    ShiftAndMultiply(x.data(), n, mean, 1.0 / deviation);
 }
 
-ErrorCode UnwrapPhase(DBL *x, int32_t n, int32_t mode) {
-    enum Mode : int32_t { Radians, RadiansToDegrees, Degrees, DegreesToRadians };
+void UnwrapPhase(RealVector x, UnwrapMode mode) {
     constexpr double degrees = 360.0;
-    if (mode < Radians || mode > DegreesToRadians)
-        return ErrInvalidSelector;
-    Unwrap(x, n, mode == Radians || mode == RadiansToDegrees ? kTwoPi : degrees);
-    if (mode == RadiansToDegrees)
-        MultiplyAndDivide(x, n, degrees, kTwoPi);
-    if (mode == DegreesToRadians)
-        MultiplyAndDivide(x, n, kTwoPi, degrees);
-    return 0;
+    const bool areRadians = mode == UnwrapMode::Radians || mode == UnwrapMode::RadiansToDegrees;
+    Unwrap(x.data(), Count(x), areRadians ? kTwoPi : degrees);
+    if (mode == UnwrapMode::RadiansToDegrees)
+        MultiplyAndDivide(x.data(), Count(x), degrees, kTwoPi);
+    if (mode == UnwrapMode::DegreesToRadians)
+        MultiplyAndDivide(x.data(), Count(x), kTwoPi, degrees);
 }
 
 } // namespace qx

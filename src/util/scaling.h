@@ -1,18 +1,17 @@
 #ifndef QX_UTIL_SCALING_H
 #define QX_UTIL_SCALING_H
 
+#include "frame/views.h"
 #include "frame/widths.h"
-#include "qx/errors.h"
-#include "qx/types.h"
 
 namespace qx {
 
-// In place over n elements, n >= 1; include/qx/scaling.h tells what they do.
-void ScaleToUnitRange(DBL *x, int32_t n, double &scale, double &offset);
-void ScaleByMagnitude(DBL *x, int32_t n, double &scale);
-void Standardise(DBL *x, int32_t n, double &mean, double &deviation);
-// ErrInvalidSelector.
-ErrorCode UnwrapPhase(DBL *x, int32_t n, int32_t mode);
+// In place over elements, of which there are some; include/qx/scaling.h says what they do.
+void ScaleToUnitRange(RealVector x, double &scale, double &offset);
+void ScaleByMagnitude(RealVector x, double &scale);
+void Standardise(RealVector x, double &mean, double &deviation);
+enum class UnwrapMode : int32_t { Radians, RadiansToDegrees, Degrees, DegreesToRadians };
+void UnwrapPhase(RealVector x, UnwrapMode mode);
 
 // The extremes of what is no NaN; crossed infinities where there is nothing.
 struct Range {

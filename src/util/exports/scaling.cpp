@@ -6,14 +6,14 @@
 namespace qx {
 namespace {
 
-int32_t Count(const Block<DBL1D> &x) { return x.size(); }
-int32_t Count(const Block<DBL2D> &x) { return x.rows() * x.cols(); }
+RealVector ElementsOf(const InOut<DBL1D> &x) { return x.view(); }
+RealVector ElementsOf(const InOut<DBL2D> &x) { return x.view().elements(); }
 
 template <class Array>
 ErrorCode UnitRange(InOut<Array> x, OutDBL scale, OutDBL offset) {
     if (x.isEmpty())
         return ErrEmptyInput;
-    ScaleToUnitRange(x.data(), Count(x), *scale.address(), *offset.address());
+    ScaleToUnitRange(ElementsOf(x), *scale.address(), *offset.address());
     return 0;
 }
 
@@ -21,7 +21,7 @@ template <class Array>
 ErrorCode ByMagnitude(InOut<Array> x, OutDBL scale) {
     if (x.isEmpty())
         return ErrEmptyInput;
-    ScaleByMagnitude(x.data(), Count(x), *scale.address());
+    ScaleByMagnitude(ElementsOf(x), *scale.address());
     return 0;
 }
 
@@ -29,7 +29,7 @@ template <class Array>
 ErrorCode Standardised(InOut<Array> x, OutDBL mean, OutDBL deviation) {
     if (x.isEmpty())
         return ErrEmptyInput;
-    Standardise(x.data(), Count(x), *mean.address(), *deviation.address());
+    Standardise(ElementsOf(x), *mean.address(), *deviation.address());
     return 0;
 }
 
@@ -37,14 +37,18 @@ template <class Array>
 ErrorCode Line(InOut<Array> x, double a, double b) {
     if (x.isEmpty())
         return ErrEmptyInput;
-    MultiplyAndShift(x.data(), Count(x), a, b);
+    const RealVector elements = ElementsOf(x);
+    MultiplyAndShift(elements.data(), static_cast<int32_t>(elements.size()), a, b);
     return 0;
 }
 
 ErrorCode Unwrapped(InOut<DBL1D> x, int32_t mode) {
     if (x.isEmpty())
         return ErrSizesDisagree; // kept: not ErrEmptyInput
-    return UnwrapPhase(x.data(), x.size(), mode);
+    if (mode < 0 || mode > static_cast<int32_t>(UnwrapMode::DegreesToRadians))
+        return ErrInvalidSelector;
+    UnwrapPhase(x.view(), static_cast<UnwrapMode>(mode));
+    return 0;
 }
 
 } // namespace
