@@ -41,17 +41,6 @@ void ExpandShifted(DBL *buffer, std::ptrdiff_t n) {
 
 } // namespace
 
-void FFTHalfToFull(DBL *buffer, int32_t n, int32_t shift) {
-    const std::ptrdiff_t length = n;
-    if (shift == 0)
-        for (std::ptrdiff_t i = length - 1; i >= 0; --i)
-            buffer[length + i] = buffer[2 * i];
-    else
-        for (std::ptrdiff_t i = 0; i < length; ++i)
-            buffer[i] = buffer[2 * i];
-    FFTCompactToFull(buffer, n, shift);
-}
-
 void FFTCompactToFull(DBL *buffer, int32_t n, int32_t shift) {
     const auto expand = shift == 0 ? ExpandPlain : ExpandShifted;
     expand(buffer, n);
