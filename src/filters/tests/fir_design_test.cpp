@@ -183,6 +183,22 @@ TEST(Parks, IsTheBestInClosedForm) {
     EXPECT_NEAR(hilbert.ripple, (1 - low) / (1 + low), 1e-15);
 }
 
+// What a grid of few points has at its ends shows in the result.
+TEST(Parks, BandsEndAtTheirEdgesAndBeforeAForcedZero) {
+    ResetHost();
+    // A band of just one step has both its edges, 1 and c on the axis of cosines, a narrower one
+    // has its upper edge alone, -1.
+    Equiripple step = {3, 0, {{1, 0, 1.0 / 64, 1}, {0, 0.495, 0.5, 1}}};
+    const double c = std::cos(2 * pi / 64);
+    EXPECT_EQ(step.taps().size(), 3U);
+    EXPECT_NEAR(step.ripple, (1 - c) / 4, 1e-15);
+    // The point at 0.49 is within a step, 1/32, of the zero at 0.5; the one before it is at 0.4375.
+    Equiripple hilbert = {3, 2, {{1, 0.125, 0.49, 1}}};
+    const double low = std::sin(2 * pi * 0.4375);
+    EXPECT_NEAR(std::fabs(hilbert.taps()[0]), 1 / (1 + low), 1e-15);
+    EXPECT_NEAR(hilbert.ripple, (1 - low) / (1 + low), 1e-15);
+}
+
 TEST(Parks, IsCountedAndLimited) {
     ResetHost();
     const std::vector<RemezBand> lowpass = {{1, 0, 0.2, 1}, {0, 0.25, 0.5, 1}};
