@@ -62,13 +62,15 @@ Path CascadePath(bool hasA, bool hasB) {
 template <class Signal, class Coefficients>
 using Filter = DirectForm<HandleTraits<Coefficients>::code, HandleTraits<Signal>::code>;
 
-// A filter of the FIR path does not read its a and yState.
+// A filter of the FIR path does not read its a and yState. Inline, as what calls it, for the
+// exports that are called for each sample: a view handed on through memory takes as long as the
+// sample.
 template <class Signal, class Coefficients>
-ErrorCode RunDirect(Path path, const In<Coefficients> &a, const In<Coefficients> &b,
-                    VectorView<HandleTraits<Signal>::code> xState,
-                    VectorView<Filter<Signal, Coefficients>::output> yState,
-                    ConstVectorView<HandleTraits<Signal>::code> x,
-                    VectorView<Filter<Signal, Coefficients>::output> y) {
+inline ErrorCode RunDirect(Path path, const In<Coefficients> &a, const In<Coefficients> &b,
+                           VectorView<HandleTraits<Signal>::code> xState,
+                           VectorView<Filter<Signal, Coefficients>::output> yState,
+                           ConstVectorView<HandleTraits<Signal>::code> x,
+                           VectorView<Filter<Signal, Coefficients>::output> y) {
     typedef Filter<Signal, Coefficients> F;
     return path == Path::FIR ? F::fir(b.view(), x, xState, y)
                              : F::iir(b.view(), xState, a.view(), yState, x, y);
@@ -130,8 +132,8 @@ Outcome FilterIntoComplex(In<DBL1D> x, Out<CDB1D> y, In<CDB1D> a, In<CDB1D> b, K
 
 // The state of x and that of y in one array.
 template <class Signal>
-Outcome RunJoined(Path path, const In<DBL1D> &a, const In<DBL1D> &b, InOut<Signal> &state,
-                  bool clears, VectorView<HandleTraits<Signal>::code> x) {
+inline Outcome RunJoined(Path path, const In<DBL1D> &a, const In<DBL1D> &b, InOut<Signal> &state,
+                         bool clears, VectorView<HandleTraits<Signal>::code> x) {
     const int32_t ofX = Memory(b.size());
     const int32_t ofY = path == Path::IIR ? Memory(a.size()) : 0;
     if (ofX > std::numeric_limits<int32_t>::max() - ofY)

@@ -311,8 +311,10 @@ TEST(Ramps, IncludeOrExcludeTheEnd) {
     Pattern(ErrEmptyInput, RampPtrn, 0, 2.0, 2.0);
     EXPECT_EQ(Pattern(0, RampPtrn, 4, 0.1, 0.7)[3], 0.7) << "the end to the bit";
     DBLArray x;
-    EXPECT_EQ(RampPtrn80(x.handle(), 4, 1.0, 3.0, 1), 0);
-    EXPECT_EQ(x.values(), (Samples{1, 1.5, 2, 2.5}));
+    for (const int32_t excludeEnd : {1, -1, 2}) { // any other than 0
+        EXPECT_EQ(RampPtrn80(x.handle(), 4, 1.0, 3.0, excludeEnd), 0);
+        EXPECT_EQ(x.values(), (Samples{1, 1.5, 2, 2.5}));
+    }
     EXPECT_EQ(RampPtrn85(x.handle(), 3, 1.0, 100.0, 0, 1), 0);
     EXPECT_EQ(x.values(), (Samples{1, 10, 100}));
     EXPECT_EQ(RampPtrn85(x.handle(), 4, 16.0, 1.0, 1, 1), 0);
