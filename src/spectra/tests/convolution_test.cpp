@@ -33,10 +33,6 @@ const double inf = std::numeric_limits<double>::infinity();
 const double nan = std::numeric_limits<double>::quiet_NaN();
 
 int32_t SizeOf(const std::vector<double> &x) { return static_cast<int32_t>(x.size()); }
-const double *Values(const std::vector<CDB> &z) {
-    return reinterpret_cast<const double *>(z.data());
-}
-double *Values(std::vector<CDB> &z) { return reinterpret_cast<double *>(z.data()); }
 
 template <class Range>
 LongSpectrum Convolved(const Range &x, const Range &y) {
