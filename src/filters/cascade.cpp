@@ -36,7 +36,7 @@ auto Section(const DBL *a, const DBL *b, typename Element<Code>::type *state,
 template <int Order, ElementType Code>
 void RunSamples(const DBL *a, const DBL *b, typename Element<Code>::type *state, int32_t sections,
                 VectorView<Code> x) {
-    for (auto &sample : x) {
+    for (typename VectorView<Code>::T &sample : x) {
         auto v = sample;
         for (std::ptrdiff_t s = 0; s < sections; ++s)
             v = Section<Order, Code>(a + s * Order, b + s * (Order + 1), state + s * Order, v);

@@ -156,7 +156,7 @@ ErrorCode Normalize(VectorView<E> out, std::ptrdiff_t nx, std::ptrdiff_t ny,
             Divide(&out[i], static_cast<double>(std::min({i + 1, count - i, m})));
         return 0;
     case Biased:
-        for (auto &value : out)
+        for (typename VectorView<E>::T &value : out)
             Divide(&value, static_cast<double>(std::max(nx, ny)));
         return 0;
     default:

@@ -95,7 +95,7 @@ void Accumulate(const Sub &sub, int32_t firstBin, double step, double phase, Com
     double c = std::cos(phase);
     double s = std::sin(phase);
     int32_t k = firstBin;
-    for (auto &sum : out) {
+    for (CDB &sum : out) {
         const CDB bin = sub.bin(k);
         sum.re += bin.re * c - bin.im * s;
         sum.im += bin.re * s + bin.im * c;
@@ -121,7 +121,7 @@ ErrorCode BandTransform(const FFTPlan *plan, VectorView<E> x, int32_t sections, 
     const int64_t L = int64_t{sections} * subLength;
     if (x.size() > L)
         FoldInput<E>(x, static_cast<int32_t>(L), subLength);
-    for (auto &value : out)
+    for (CDB &value : out)
         value = CDB{};
 
     const int64_t gathered = SubSpectrum<E>::WorkPerBin * subLength;

@@ -42,7 +42,7 @@ ErrorCode FastHartleyInverse(const FFTPlan *plan, RealVector x) {
     if (const ErrorCode failed = FastHartley(plan, x))
         return failed;
     const double scale = 1.0 / static_cast<double>(x.size());
-    for (auto &value : x)
+    for (DBL &value : x)
         value *= scale;
     return 0;
 }
@@ -70,7 +70,7 @@ ErrorCode FastHilbert(const FFTPlan *plan, RealVector x) {
 ErrorCode FastHilbertInverse(const FFTPlan *plan, RealVector x) {
     if (const ErrorCode failed = FastHilbert(plan, x))
         return failed;
-    for (auto &value : x)
+    for (DBL &value : x)
         value = -value;
     return 0;
 }
