@@ -68,10 +68,12 @@ int main() {
     for (const int32_t n : {100, 1000, 10000, 100000, 1000000, 10000000}) {
         const std::vector<double> x = Random(n, 1), y = Random(n, 2), w = Random(n, 3);
         std::vector<double> fit(x.size());
-        double slope, intercept, mse;
+        qx::Line line;
+        double mse;
         const auto fitLine = [&](const double *weights, double *to, double *error) {
-            qx::FitLine(x.data(), y.data(), n, weights, to, &slope, &intercept, error);
-            Keep(slope);
+            qx::FitLine({{x.data(), n}, {y.data(), n}, {weights, weights == nullptr ? 0 : n}},
+                        &line, {{to, to == nullptr ? 0 : n}, error});
+            Keep(line.slope);
         };
         const auto times = LeastTimes([&] { Sums(x, y); },
                                       [&] {

@@ -15,18 +15,19 @@ namespace {
 // The upper triangle of a banded matrix with `band` diagonals and the target of each row.
 class BandedTriangle {
 public:
-    BandedTriangle(DBL *elements, int32_t order, int32_t band)
-        : elements_(elements), order_(order), band_(band) {
-        Fill(row(0), std::ptrdiff_t{order} * (band + 1), 0.0);
+    explicit BandedTriangle(RealMatrix elements)
+        : elements_(elements), order_(elements.rows()), band_(elements.cols() - 1) {
+        for (DBL &element : elements.elements())
+            element = 0.0;
     }
     // Element (i, i + j), j < band; at j = band the target.
-    DBL *row(int32_t i) const { return elements_ + std::ptrdiff_t{i} * (band_ + 1); }
+    DBL *row(int32_t i) const { return elements_.row(i); }
     // No diagonal element is negligible beside its column.
     bool hasFullRank() const;
-    void solve(DBL *x) const;
+    void solve(RealVector x) const;
 
 private:
-    DBL *elements_;
+    RealMatrix elements_;
     int32_t order_, band_;
 };
 
@@ -41,7 +42,7 @@ bool BandedTriangle::hasFullRank() const {
     return true;
 }
 
-void BandedTriangle::solve(DBL *x) const {
+void BandedTriangle::solve(RealVector x) const {
     for (int32_t i = order_ - 1; i >= 0; --i) {
         const DBL *const r = row(i);
         double rest = r[band_];
@@ -55,38 +56,41 @@ void BandedTriangle::solve(DBL *x) const {
 // a length.
 class Spans {
 public:
-    Spans(const SpanSamples &all, const DBL *knots, int32_t degree, int32_t count)
-        : all_(all), knots_(knots), span_(degree), last_(count - 1) {
+    Spans(const FitSamples &all, ConstRealVector knots, int32_t degree)
+        : all_(all), knots_(knots), span_(degree),
+          last_(static_cast<int32_t>(knots.size()) - degree - 2) {
         while (last_ > degree && !(knots[last_] < knots[last_ + 1]))
             --last_;
     }
     // The next run, of at most kSplineRows samples; false behind the last one.
     bool next(SpanSamples *run) {
         first_ += count_;
-        if (first_ >= all_.count)
+        if (first_ >= all_.n())
             return false;
         while (span_ < last_ && !(all_.x[first_] < knots_[span_ + 1]))
             ++span_;
-        const int32_t most = std::min(kSplineRows, all_.count - first_);
-        const DBL *const x = all_.x + first_;
+        const int32_t most = std::min(kSplineRows, all_.n() - first_);
+        const DBL *const x = all_.x.data() + first_;
         count_ = span_ == last_ ? most : 1;
         while (count_ < most && x[count_] < knots_[span_ + 1])
             ++count_;
-        *run = {x, all_.y + first_, all_.w == nullptr ? nullptr : all_.w + first_, count_};
+        const DBL *const w = all_.weights();
+        *run = {x, all_.y.data() + first_, w == nullptr ? nullptr : w + first_, count_};
         return true;
     }
     int32_t first() const { return first_; }
     int32_t span() const { return span_; }
 
 private:
-    const SpanSamples all_;
-    const DBL *knots_;
+    const FitSamples &all_;
+    const ConstRealVector knots_;
     int32_t span_, last_, first_ = 0, count_ = 0;
 };
 
 // A power of two near 1 / sqrt(largest |w|), with which no square of a row leaves the range.
-double ScaleOfWeights(const DBL *w, int32_t n) {
-    const double largest = w == nullptr ? 1.0 : LargestWeight(w, n);
+double ScaleOfWeights(const FitSamples &samples) {
+    const DBL *const w = samples.weights();
+    const double largest = w == nullptr ? 1.0 : LargestWeight(w, samples.n());
     int exponent;
     std::frexp(largest == 0.0 ? 1.0 : std::sqrt(largest), &exponent);
     return std::ldexp(1.0, -exponent);
@@ -94,49 +98,56 @@ double ScaleOfWeights(const DBL *w, int32_t n) {
 
 } // namespace
 
-void MakeKnots(const DBL *x, int32_t n, int32_t degree, int32_t interior, const DBL *given,
-               DBL *knots) {
-    Fill(knots, degree + 1, x[0]);
-    DBL *const inner = knots + degree + 1;
-    for (int32_t i = 0; i < interior; ++i) {
-        if (given != nullptr) {
+void MakeKnots(ConstRealVector x, int32_t degree, ConstRealVector given, RealVector knots) {
+    const std::ptrdiff_t n = x.size(), ends = degree + 1, interior = knots.size() - 2 * ends;
+    QX_EXPECTS(given.isEmpty() || given.size() == interior);
+    for (std::ptrdiff_t i = 0; i < ends; ++i) {
+        knots[i] = x[0];
+        knots[ends + interior + i] = x[n - 1];
+    }
+    const RealVector inner = knots.part(ends, interior);
+    for (std::ptrdiff_t i = 0; i < interior; ++i) {
+        if (!given.isEmpty()) {
             inner[i] = given[i];
             continue;
         }
-        const double position = (i + 1.0) * (n - 1.0) / (interior + 1.0);
-        const auto below = std::min(static_cast<int32_t>(position), n - 2);
-        const double share = position - below, low = x[below], high = x[below + 1];
+        const auto at = static_cast<double>(i), last = static_cast<double>(n - 1);
+        const double position = (at + 1.0) * last / (static_cast<double>(interior) + 1.0);
+        const auto below = std::min(static_cast<std::ptrdiff_t>(position), n - 2);
+        const double share = position - static_cast<double>(below);
+        const double low = x[below], high = x[below + 1];
         inner[i] = std::min(low + share * (high - low), high);
     }
-    Fill(inner + interior, degree + 1, x[n - 1]);
 }
 
-ErrorCode FitBSpline(const DBL *x, const DBL *y, const DBL *w, int32_t n, int32_t degree,
-                     const DBL *knots, int32_t count, DBL *coefficients, DBL *values, DBL *mse) {
-    if (!(x[0] < x[n - 1]))
+ErrorCode FitBSpline(const FitSamples &samples, int32_t degree, ConstRealVector knots,
+                     RealVector coefficients, const FitOutput &out) {
+    const int32_t n = samples.n(), stride = degree + 2;
+    if (!(samples.x[0] < samples.x[n - 1]))
         return ErrPolynomialOrderTooHigh;
-    const int32_t stride = degree + 2;
-    DBL *elements, *rows;
+    RealMatrix elements;
+    DBL *rows;
     ScratchParts memory;
-    if (const ErrorCode failed = memory.take(Sized(elements, int64_t{count} * stride),
-                                             Sized(rows, kSplineRows * stride)))
+    const auto count = static_cast<int32_t>(coefficients.size());
+    if (const ErrorCode failed =
+            memory.take(Sized(elements, count, stride), Sized(rows, kSplineRows * stride)))
         return failed;
-    const BandedTriangle triangle(elements, count, degree + 1);
-    const SpanSamples all = {x, y, w, n};
-    const double scale = ScaleOfWeights(w, n);
+    const BandedTriangle triangle(elements);
+    const double scale = ScaleOfWeights(samples);
     SpanSamples run;
-    for (Spans spans(all, knots, degree, count); spans.next(&run);)
-        ReduceSpan(&run, knots + spans.span(), degree, scale, triangle.row(spans.span() - degree),
-                   rows);
+    for (Spans spans(samples, knots, degree); spans.next(&run);)
+        ReduceSpan(&run, knots.data() + spans.span(), degree, scale,
+                   triangle.row(spans.span() - degree), rows);
     if (!triangle.hasFullRank())
         return ErrPolynomialOrderTooHigh;
     triangle.solve(coefficients);
 
     double squares[4] = {};
-    for (Spans spans(all, knots, degree, count); spans.next(&run);)
-        EvaluateSpan(&run, knots + spans.span(), degree, coefficients + spans.span() - degree,
-                     values + spans.first(), squares);
-    *mse = ((squares[0] + squares[1]) + (squares[2] + squares[3])) / n;
+    for (Spans spans(samples, knots, degree); spans.next(&run);)
+        EvaluateSpan(&run, knots.data() + spans.span(), degree,
+                     coefficients.data() + spans.span() - degree, out.values.data() + spans.first(),
+                     squares);
+    *out.mse = ((squares[0] + squares[1]) + (squares[2] + squares[3])) / n;
     return 0;
 }
 

@@ -1,9 +1,6 @@
-#include "fit/bounded_fits.h"
+#include "fit/bounded_frame.h"
 #include "fit/line.h"
-#include "fit/weights.h"
 #include "frame/constants.h"
-#include "frame/scratch.h"
-#include "linalg/matrix.h"
 
 #include <algorithm>
 #include <cmath>
@@ -11,13 +8,6 @@
 namespace qx {
 
 namespace {
-
-double WeightOf(const DBL *w, int32_t i) { return w == nullptr ? 1.0 : std::fabs(w[i]); }
-
-struct Line {
-    double slope, intercept;
-    double at(double x) const { return slope * x + intercept; }
-};
 
 struct Interval {
     double lower, upper;
@@ -132,7 +122,7 @@ Line BestOfEdges(const Quadratic &q, const Interval &slopes, const Interval &int
 }
 
 Line LineWithin(const FitSamples &samples, const FitBounds &bounds) {
-    const Quadratic q = {SumsOfLine(samples.x, samples.y, samples.n, samples.w)};
+    const Quadratic q = {SumsOfLine(samples)};
     const Interval slopes = {bounds.lower[0], bounds.upper[0]};
     const Interval intercepts = {bounds.lower[1], bounds.upper[1]};
     const Line plain = q.lowest();
@@ -143,42 +133,43 @@ Line LineWithin(const FitSamples &samples, const FitBounds &bounds) {
 }
 
 // The mean of |w r|, or of |w| r^2.
-double Norm(const FitSamples &samples, const Line &line, int32_t method) {
+double Cost(const FitSamples &samples, const Line &line, int32_t norm) {
     double sum = 0.0;
-    for (int32_t i = 0; i < samples.n; ++i) {
+    for (int32_t i = 0; i < samples.n(); ++i) {
         const double r = samples.y[i] - line.at(samples.x[i]);
-        sum += WeightOf(samples.w, i) * (method == leastAbsolute ? std::fabs(r) : r * r);
+        sum += samples.weight(i) * (norm == leastAbsolute ? std::fabs(r) : r * r);
     }
-    return sum / samples.n;
+    return sum / samples.n();
 }
 
 // The line of least squares again and again, with the weights that follow from the last one.
-class Reweighting {
+class RobustLine {
 public:
-    Reweighting(const FitSamples &samples, const FitBounds &bounds)
-        : samples_(samples), bounds_(bounds) {}
+    RobustLine(const FitSamples &samples, const FitBounds &bounds, FitNorm norm)
+        : samples_(samples), bounds_(bounds), state_{norm, 2, samples.w} {}
 
-    ErrorCode allocate() { return memory_.allocate(3 * int64_t{samples_.n}); }
+    ErrorCode allocate() { return state_.take(samples_.n()); }
 
     // From *line on. *rounds is the limit, and then the count. Least absolute residuals have a norm
     // by which the best line is known; bisquare has come to rest where it ends.
-    ErrorCode run(int32_t method, double tolerance, int32_t *rounds, Line *line) {
+    ErrorCode run(FitNorm norm, double tolerance, int32_t *rounds, Line *line) {
         const int32_t limit = *rounds;
-        if (method == bisquare)
+        state_.norm = norm;
+        if (norm == bisquare)
             findLeverageFactors();
         Line last = *line;
-        double lowest = Norm(samples_, last, method);
+        double lowest = Cost(samples_, last, norm);
         // A line follows from the one before, so lines that come back come back for ever (R. P.
         // Brent, "An improved Monte Carlo factorization algorithm", 1980, finds them so).
         Line earlier = last;
         int32_t noted = 0;
         for (*rounds = 1; *rounds <= limit; ++*rounds) {
-            if (const ErrorCode failed = findWeights(last, method))
+            if (const ErrorCode failed = findWeights(last))
                 return failed;
-            const Line next = LineWithin({samples_.x, samples_.y, weights(), samples_.n}, bounds_);
-            const double norm = Norm(samples_, next, method);
-            if (method == bisquare || norm < lowest) {
-                lowest = norm;
+            const Line next = LineWithin({samples_.x, samples_.y, state_.weights}, bounds_);
+            const double cost = Cost(samples_, next, norm);
+            if (norm == bisquare || cost < lowest) {
+                lowest = cost;
                 *line = next;
             }
             if (isSettled(last, next, tolerance))
@@ -196,43 +187,35 @@ public:
     }
 
 private:
-    DBL *residuals() const { return memory_.data(); }
-    DBL *weights() const { return memory_.data() + samples_.n; }
-    DBL *factors() const { return memory_.data() + 2 * std::ptrdiff_t{samples_.n}; }
-
-    ErrorCode findWeights(const Line &line, int32_t method) {
-        for (int32_t i = 0; i < samples_.n; ++i) {
-            const double r = samples_.y[i] - line.at(samples_.x[i]);
-            residuals()[i] = method == bisquare ? r * factors()[i] : r;
-        }
-        return method == bisquare
-                   ? BisquareWeights(residuals(), samples_.w, samples_.n, 2, weights())
-                   : LeastAbsoluteWeights(residuals(), samples_.w, samples_.n, weights());
+    ErrorCode findWeights(const Line &line) const {
+        for (int32_t i = 0; i < samples_.n(); ++i)
+            state_.residuals[i] = samples_.y[i] - line.at(samples_.x[i]);
+        return state_.findWeights();
     }
 
     void findLeverageFactors() {
         double weight = 0.0, mean = 0.0, spread = 0.0;
-        for (int32_t i = 0; i < samples_.n; ++i) {
-            weight += WeightOf(samples_.w, i);
-            mean += WeightOf(samples_.w, i) * samples_.x[i];
+        for (int32_t i = 0; i < samples_.n(); ++i) {
+            weight += samples_.weight(i);
+            mean += samples_.weight(i) * samples_.x[i];
         }
         mean /= weight;
-        for (int32_t i = 0; i < samples_.n; ++i) {
+        for (int32_t i = 0; i < samples_.n(); ++i) {
             const double d = samples_.x[i] - mean;
-            spread += WeightOf(samples_.w, i) * (d * d);
+            spread += samples_.weight(i) * (d * d);
         }
-        for (int32_t i = 0; i < samples_.n; ++i) {
+        for (int32_t i = 0; i < samples_.n(); ++i) {
             const double d = samples_.x[i] - mean;
             const double ofSlope = spread > 0.0 ? d * d / spread : 0.0;
-            factors()[i] = WeightOf(samples_.w, i) * (1.0 / weight + ofSlope);
+            state_.factors[i] = samples_.weight(i) * (1.0 / weight + ofSlope);
         }
-        LeverageFactors(factors(), samples_.w, samples_.n, factors());
+        state_.setLeverages();
     }
 
     // The line moves by a part of the residuals, or within the rounding of the data.
     bool isSettled(const Line &last, const Line &next, double tolerance) const {
         double moved = 0.0, size = 0.0, rest = 0.0;
-        for (int32_t i = 0; i < samples_.n; ++i) {
+        for (int32_t i = 0; i < samples_.n(); ++i) {
             const double f = next.at(samples_.x[i]);
             moved += std::fabs(f - last.at(samples_.x[i]));
             size += std::fabs(samples_.y[i]);
@@ -243,98 +226,80 @@ private:
 
     const FitSamples &samples_;
     const FitBounds &bounds_;
-    Scratch<ElementType::DBL> memory_;
+    Reweighting state_;
 };
 
-// One sample and a second one that the fixed parameter puts beside it.
-struct TwoSamples {
-    DBL x[2], y[2], w[2];
-    FitSamples make(const FitSamples &samples, const FitBounds &bounds) {
-        const double x0 = samples.x[0], y0 = samples.y[0];
-        const double upperSlope = bounds.upper[0], upperIntercept = bounds.upper[1];
-        x[0] = x0;
-        x[1] = x0 + 1.0;
-        y[0] = y0;
-        if (bounds.lower[0] == upperSlope)
-            y[1] = y0 + upperSlope;
-        else
-            y[1] = x0 == 0.0 ? y0 + 1.0 : ((x0 + 1.0) * y0 - upperIntercept) / x0;
-        w[0] = w[1] = samples.w == nullptr ? 1.0 : samples.w[0];
-        return {x, y, samples.w == nullptr ? nullptr : w, 2};
+class LineFit {
+public:
+    // A second sample that the fixed parameter puts beside the first.
+    ErrorCode pad(const BoundedFit &request, FitSamples *samples) {
+        const FitBounds &bounds = request.bounds;
+        const double x0 = samples->x[0], y0 = samples->y[0];
+        double y1 = y0 + bounds.upper[0];
+        if (bounds.lower[0] != bounds.upper[0])
+            y1 = x0 == 0.0 ? y0 + 1.0 : ((x0 + 1.0) * y0 - bounds.upper[1]) / x0;
+        *samples = two_.make(*samples, x0 + 1.0, y1);
+        return 0;
     }
+
+    ErrorCode checkAbscissae(const FitSamples &) const { return 0; }
+
+    ErrorCode fit(const BoundedFit &request, const FitSamples &samples) const {
+        for (std::ptrdiff_t i = 0; i < 2; ++i)
+            if (request.bounds.lower[i] > request.bounds.upper[i])
+                return ErrBoundsCrossed;
+        ErrorCode status = 0;
+        if (request.method == leastSquares) {
+            const Line line = LineWithin(samples, request.bounds);
+            request.p[0] = line.slope;
+            request.p[1] = line.intercept;
+        } else {
+            BoundedFit settled = request;
+            settled.samples = samples;
+            status = FitLineRobustly(settled);
+        }
+        FitSamples given = request.samples;
+        if (samples.w.isEmpty())
+            given.w = {};
+        *request.mse = Cost(given, {request.p[0], request.p[1]}, request.method);
+        return status;
+    }
+
+    double value(double x, const DBL *p) const { return Line{p[0], p[1]}.at(x); }
+
+private:
+    TwoSamples two_;
 };
 
 } // namespace
 
-void BoundLine(const FitSamples &samples, const FitBounds &bounds, DBL *slope, DBL *intercept) {
-    const Line line = LineWithin(samples, bounds);
-    *slope = line.slope;
-    *intercept = line.intercept;
-}
-
-ErrorCode FitLineRobustly(const FitSamples &samples, const FitBounds &bounds, int32_t method,
-                          double tolerance, int32_t *iterations, DBL *p, double *norm) {
-    Reweighting reweighting(samples, bounds);
-    if (const ErrorCode failed = reweighting.allocate())
+ErrorCode FitLineRobustly(const BoundedFit &request) {
+    const FitSamples &samples = request.samples;
+    const auto norm = static_cast<FitNorm>(request.method);
+    RobustLine robust(samples, request.bounds, norm);
+    if (const ErrorCode failed = robust.allocate())
         return failed;
-    Line line = LineWithin(samples, bounds);
-    const int32_t limit = std::clamp(*iterations, 1, mostIterations);
+    Line line = LineWithin(samples, request.bounds);
+    const int32_t limit = std::clamp(*request.iterations, 1, mostIterations);
     int32_t done = 0;
     // Samples that all lie on one side of the plain line would take its place as the bulk of the
     // data; the line of least absolute residuals goes through the bulk.
-    if (method == bisquare) {
+    if (norm == bisquare) {
         constexpr double nearEnough = 0.01;
         done = limit / 2;
-        const ErrorCode status = reweighting.run(leastAbsolute, nearEnough, &done, &line);
+        const ErrorCode status = robust.run(leastAbsolute, nearEnough, &done, &line);
         if (status != 0 && status != ErrIterationLimit)
             return status;
     }
-    *iterations = limit - done;
-    const ErrorCode status = reweighting.run(method, tolerance, iterations, &line);
-    *iterations += done;
-    p[0] = line.slope;
-    p[1] = line.intercept;
-    *norm = Norm(samples, line, method);
+    *request.iterations = limit - done;
+    const ErrorCode status = robust.run(norm, request.tolerance, request.iterations, &line);
+    *request.iterations += done;
+    request.p[0] = line.slope;
+    request.p[1] = line.intercept;
+    *request.mse = Cost(samples, line, norm);
     return status;
 }
 
-ErrorCode FitBoundedLine(const BoundedFit &request) {
-    if (request.samples.n < FreeParameters(request.bounds, 2))
-        return ErrFitPointsTooFew;
-    if (request.samples.n == 0) {
-        TakeUpperBounds(request, 2);
-        return 0;
-    }
-    TwoSamples two;
-    FitSamples samples = request.samples;
-    if (samples.n == 1)
-        samples = two.make(samples, request.bounds);
-    if (samples.w != nullptr && CheckFinite(samples.w, samples.n) != 0)
-        return ErrNonFiniteInput;
-    if (const ErrorCode failed = SettleWeights(samples.n, 2, &samples.w))
-        return failed;
-    for (int32_t i = 0; i < 2; ++i)
-        if (request.bounds.lower[i] > request.bounds.upper[i])
-            return ErrBoundsCrossed;
-
-    ErrorCode status = 0;
-    if (request.method == leastSquares) {
-        BoundLine(samples, request.bounds, &request.p[0], &request.p[1]);
-    } else {
-        const double tolerance = request.tolerance <= 0.0 ? 0.0001 : request.tolerance;
-        status = FitLineRobustly(samples, request.bounds, request.method, tolerance,
-                                 request.iterations, request.p, request.mse);
-        if (status != 0 && status != ErrIterationLimit)
-            return status;
-    }
-    const Line line = {request.p[0], request.p[1]};
-    const FitSamples given = {request.samples.x, request.samples.y,
-                              samples.w == nullptr ? nullptr : request.samples.w,
-                              request.samples.n};
-    *request.mse = Norm(given, line, request.method);
-    for (int32_t i = 0; i < given.n; ++i)
-        request.fit[i] = line.at(given.x[i]);
-    return status;
-}
+ErrorCode FitBoundedLine(const BoundedFit &request) { return FitInFrame(request, LineFit()); }
 
 } // namespace qx

@@ -2,7 +2,6 @@
 
 #include "fit/damped_step.h"
 #include "frame/constants.h"
-#include "frame/scratch.h"
 #include "linalg/matrix.h"
 #include "linalg/systems/least_squares.h"
 
@@ -15,49 +14,44 @@ namespace qx {
 
 namespace {
 
-double WeightOf(const DBL *w, int32_t i) { return w == nullptr ? 1.0 : std::fabs(w[i]); }
-
 void Copy(DBL *to, const DBL *from, std::ptrdiff_t count) {
     std::memcpy(to, from, sizeof(DBL) * static_cast<std::size_t>(count));
 }
 
 // Central differences; `moved` is p but for the one parameter that moves.
-void NumericGradient(const FitModel &model, double x, const DBL *p, DBL *moved, DBL *out) {
+void NumericGradient(const FitModel &model, double x, RealVector p, RealVector moved,
+                     RealVector out) {
     const double leastSize = std::sqrt(kEpsilon);
     for (int32_t i = 0; i < model.count; ++i) {
         const double size = std::fabs(p[i]);
         const double h = 3e-06 * (size > leastSize ? size : leastSize);
         moved[i] = p[i] + h;
-        const double above = model.value(x, moved, model.count, model.user);
+        const double above = model.value(x, moved.data(), model.count, model.user);
         moved[i] = p[i] - h;
-        const double below = model.value(x, moved, model.count, model.user);
+        const double below = model.value(x, moved.data(), model.count, model.user);
         out[i] = (above - below) / (2.0 * h);
         moved[i] = p[i];
     }
 }
 
-void Residuals(const FitModel &model, const FitSamples &samples, const DBL *p, DBL *r) {
-    for (int32_t i = 0; i < samples.n; ++i)
-        r[i] = samples.y[i] - model.value(samples.x[i], p, model.count, model.user);
+void FindResiduals(const FitModel &model, const FitSamples &samples, RealVector p, RealVector r) {
+    for (int32_t i = 0; i < samples.n(); ++i)
+        r[i] = samples.y[i] - model.value(samples.x[i], p.data(), model.count, model.user);
 }
 
-FitSamples Weighted(const FitSamples &samples, const DBL *weights) {
-    return {samples.x, samples.y, weights, samples.n};
-}
-
-void MirrorLowerTriangle(DBL *a, int32_t count) {
-    for (int32_t i = 0; i < count; ++i)
+void MirrorLowerTriangle(RealMatrix a) {
+    for (int32_t i = 0; i < a.rows(); ++i)
         for (int32_t j = 0; j < i; ++j)
-            a[j * count + i] = a[i * count + j];
+            a(j, i) = a(i, j);
 }
 
 // row^T inverse row.
-double Leverage(const DBL *row, const DBL *inverse, int32_t count) {
+double Leverage(const DBL *row, RealMatrix inverse) {
     double sum = 0.0;
-    for (int32_t i = 0; i < count; ++i) {
+    for (int32_t i = 0; i < inverse.rows(); ++i) {
         double product = 0.0;
-        for (int32_t j = 0; j < count; ++j)
-            product += inverse[i * count + j] * row[j];
+        for (int32_t j = 0; j < inverse.cols(); ++j)
+            product += inverse(i, j) * row[j];
         sum += row[i] * product;
     }
     return sum;
@@ -65,90 +59,80 @@ double Leverage(const DBL *row, const DBL *inverse, int32_t count) {
 
 } // namespace
 
-int64_t EvaluationWork(int32_t n, int32_t count, int32_t method) {
-    const int64_t gradient = 2 * int64_t{count};
-    if (method == leastSquares)
-        return gradient;
-    const int64_t residualsAndWeights = 2 * int64_t{n};
-    if (method == leastAbsolute)
-        return gradient + residualsAndWeights;
-    const int64_t leverages = n;
-    return gradient + residualsAndWeights + leverages + int64_t{n} * count + int64_t{count} * count;
+ErrorCode EvaluationMemory::take(int32_t n) {
+    const int32_t count = state.parameters, leverages = state.norm == bisquare ? count : 0;
+    if (const ErrorCode failed = memory_.take(Sized(gradient, count), Sized(moved, count),
+                                              Sized(inverse, leverages, leverages),
+                                              Sized(jacobian, leverages > 0 ? n : 0, leverages)))
+        return failed;
+    return state.norm == leastSquares ? 0 : state.take(n);
 }
 
-void EvalLeastSquares(const FitModel &model, const FitSamples &samples, const DBL *p, DBL *a,
-                      DBL *jacobian, DBL *g, double *cost, DBL *work) {
+void EvalLeastSquares(const FitModel &model, const FitSamples &samples, FitPoint &at,
+                      EvaluationMemory &memory, RealMatrix jacobian) {
+    const auto &[p, a, g, cost] = at;
     const int32_t count = model.count;
     if (model.normal != nullptr) {
-        model.normal(samples, p, count, cost, a, jacobian, g, model.user);
+        model.normal(samples, p.data(), count, &at.cost, a.data(), jacobian.data(), g.data(),
+                     model.user);
         return;
     }
-    DBL *const d = work;
-    DBL *const moved = d + count;
-    Copy(moved, p, count);
-    Fill(a, std::ptrdiff_t{count} * count, 0.0);
-    Fill(g, count, 0.0);
+    const RealVector d = memory.gradient;
+    Copy(memory.moved.data(), p.data(), count);
+    Fill(a.data(), std::ptrdiff_t{count} * count, 0.0);
+    Fill(g.data(), count, 0.0);
     double sum = 0.0;
-    for (int32_t k = 0; k < samples.n; ++k) {
+    for (int32_t k = 0; k < samples.n(); ++k) {
         const double x = samples.x[k];
-        const double weight = WeightOf(samples.w, k);
-        const double r = samples.y[k] - model.value(x, p, count, model.user);
+        const double weight = samples.weight(k);
+        const double r = samples.y[k] - model.value(x, p.data(), count, model.user);
         sum += weight * (r * r);
         if (model.gradient != nullptr)
-            model.gradient(x, p, count, d, model.user);
+            model.gradient(x, p.data(), count, d.data(), model.user);
         else
-            NumericGradient(model, x, p, moved, d);
+            NumericGradient(model, x, p, memory.moved, d);
         for (int32_t i = 0; i < count; ++i) {
             const double weighted = weight * d[i];
             for (int32_t j = 0; j <= i; ++j)
-                a[i * count + j] += weighted * d[j];
+                a(i, j) += weighted * d[j];
             g[i] += weighted * r;
         }
-        if (jacobian != nullptr)
-            Copy(jacobian + std::ptrdiff_t{k} * count, d, count);
+        if (!jacobian.isEmpty())
+            Copy(jacobian.row(k), d.data(), count);
     }
-    *cost = sum / samples.n;
-    MirrorLowerTriangle(a, count);
+    at.cost = sum / samples.n();
+    MirrorLowerTriangle(a);
 }
 
-ErrorCode EvalLeastAbsolute(const FitModel &model, const FitSamples &samples, const DBL *p, DBL *a,
-                            DBL *g, double *cost, DBL *work) {
-    const int32_t n = samples.n;
-    DBL *const r = work + 2 * std::ptrdiff_t{model.count};
-    DBL *const weights = r + n;
-    Residuals(model, samples, p, r);
-    if (const ErrorCode failed = LeastAbsoluteWeights(r, samples.w, n, weights))
+ErrorCode EvalLeastAbsolute(const FitModel &model, const FitSamples &samples, FitPoint &at,
+                            EvaluationMemory &memory) {
+    const Reweighting &state = memory.state;
+    FindResiduals(model, samples, at.p, state.residuals);
+    if (const ErrorCode failed = state.findWeights())
         return failed;
-    double squares;
-    EvalLeastSquares(model, Weighted(samples, weights), p, a, nullptr, g, &squares, work);
+    EvalLeastSquares(model, {samples.x, samples.y, state.weights}, at, memory);
     double sum = 0.0;
-    for (int32_t i = 0; i < n; ++i)
-        sum += WeightOf(samples.w, i) * std::fabs(r[i]);
-    *cost = sum / n;
+    for (int32_t i = 0; i < samples.n(); ++i)
+        sum += samples.weight(i) * std::fabs(state.residuals[i]);
+    at.cost = sum / samples.n();
     return 0;
 }
 
-ErrorCode EvalBisquare(const FitModel &model, const FitSamples &samples, const DBL *p, DBL *a,
-                       DBL *g, double *cost, DBL *work) {
-    const int32_t n = samples.n, count = model.count;
-    DBL *const r = work + 2 * std::ptrdiff_t{count};
-    DBL *const weights = r + n;
-    DBL *const factors = weights + n;
-    DBL *const inverse = factors + n;
-    DBL *const jacobian = inverse + std::ptrdiff_t{count} * count;
-    EvalLeastSquares(model, samples, p, a, jacobian, g, cost, work);
+ErrorCode EvalBisquare(const FitModel &model, const FitSamples &samples, FitPoint &at,
+                       EvaluationMemory &memory) {
+    Reweighting &state = memory.state;
+    const int32_t count = model.count;
+    DBL *const a = at.a.data(), *const inverse = memory.inverse.data();
+    EvalLeastSquares(model, samples, at, memory, memory.jacobian);
     if (const ErrorCode failed = PseudoInverseMatrix(a, count, count, -1.0, inverse))
         return failed;
-    for (int32_t i = 0; i < n; ++i)
-        factors[i] =
-            WeightOf(samples.w, i) * Leverage(jacobian + std::ptrdiff_t{i} * count, inverse, count);
-    LeverageFactors(factors, samples.w, n, factors);
-    Residuals(model, samples, p, r);
-    for (int32_t i = 0; i < n; ++i)
-        r[i] *= factors[i];
-    if (const ErrorCode failed = BisquareWeights(r, samples.w, n, count, weights))
+    for (int32_t i = 0; i < samples.n(); ++i)
+        state.factors[i] = samples.weight(i) * Leverage(memory.jacobian.row(i), memory.inverse);
+    state.setLeverages();
+    FindResiduals(model, samples, at.p, state.residuals);
+    if (const ErrorCode failed = state.findWeights())
         return failed;
-    EvalLeastSquares(model, Weighted(samples, weights), p, a, nullptr, g, cost, work);
+    EvalLeastSquares(model, {samples.x, samples.y, state.weights}, at, memory);
     return 0;
 }
 
@@ -156,32 +140,26 @@ namespace {
 
 class Iteration {
 public:
-    Iteration(const FitModel &model, const FitSamples &samples, int32_t method,
+    Iteration(const FitModel &model, const FitSamples &samples, FitNorm norm,
               const FitBounds &bounds)
-        : model_(model), samples_(samples), bounds_(bounds), method_(method), count_(model.count) {}
+        : model_(model), samples_(samples), bounds_(bounds), norm_(norm), count_(model.count),
+          evaluation_(model, samples, norm) {}
 
     ErrorCode allocate() {
-        const int64_t count = count_;
-        const int64_t ofPoint = count + count * count + count;
-        if (const ErrorCode failed =
-                memory_.allocate(3 * ofPoint + EvaluationWork(samples_.n, count_, method_)))
+        if (const ErrorCode failed = memory_.take(
+                Sized(current_.p, count_), Sized(current_.a, count_, count_),
+                Sized(current_.g, count_), Sized(trial_.p, count_), Sized(trial_.a, count_, count_),
+                Sized(trial_.g, count_), Sized(damped_.p, count_), Sized(damped_.a, count_, count_),
+                Sized(damped_.g, count_), Sized(pivots_, count_)))
             return failed;
-        DBL *next = memory_.data();
-        for (Point *const point : {&current_, &trial_, &damped_}) {
-            point->p = next;
-            point->a = point->p + count;
-            point->g = point->a + count * count;
-            next += ofPoint;
-        }
-        work_ = next;
-        return pivots_.allocate(count);
+        return evaluation_.take(samples_.n());
     }
 
     // The best point stands at point() afterwards, also after a failure.
     ErrorCode run(const DBL *start, int32_t limit, double tolerance, double *lambda,
                   int32_t *steps) {
         const double startLambda = *lambda;
-        Copy(current_.p, start, count_);
+        Copy(current_.p.data(), start, count_);
         project(current_.p);
         *steps = 0;
         if (const ErrorCode failed = evaluate(current_))
@@ -191,7 +169,7 @@ public:
         for (int32_t &k = *steps; limit < 0 || k <= limit; ++k) {
             if (const ErrorCode failed = propose(*lambda))
                 return failed;
-            if (method_ == bisquare && std::isfinite(current_.cost) && largestChange() <= tolerance)
+            if (norm_ == bisquare && std::isfinite(current_.cost) && largestChange() <= tolerance)
                 return 0;
             if (const ErrorCode failed = evaluate(trial_))
                 return failed;
@@ -225,17 +203,15 @@ public:
         return 0;
     }
 
-    const DBL *point() const { return current_.p; }
+    const DBL *point() const { return current_.p.data(); }
     double cost() const { return current_.cost; }
 
 private:
-    struct Point {
-        DBL *p, *a, *g;
-        double cost;
+    struct Point : FitPoint {
         bool hasFailed; // no residuals, or no weights from them: the cost is NaN
     };
 
-    void project(DBL *p) const {
+    void project(RealVector p) const {
         for (int32_t i = 0; i < count_; ++i) {
             if (isAtLower(p, i))
                 p[i] = bounds_.lower[i];
@@ -243,22 +219,22 @@ private:
                 p[i] = bounds_.upper[i];
         }
     }
-    bool isAtLower(const DBL *p, int32_t i) const {
-        return bounds_.lower != nullptr && p[i] <= bounds_.lower[i];
+    bool isAtLower(RealVector p, int32_t i) const {
+        return !bounds_.lower.isEmpty() && p[i] <= bounds_.lower[i];
     }
-    bool isAtUpper(const DBL *p, int32_t i) const {
-        return bounds_.upper != nullptr && p[i] >= bounds_.upper[i];
+    bool isAtUpper(RealVector p, int32_t i) const {
+        return !bounds_.upper.isEmpty() && p[i] >= bounds_.upper[i];
     }
 
     // Only a lack of memory ends the iteration.
     ErrorCode evaluate(Point &at) {
         ErrorCode status = 0;
-        if (method_ == leastSquares)
-            EvalLeastSquares(model_, samples_, at.p, at.a, nullptr, at.g, &at.cost, work_);
-        else if (method_ == leastAbsolute)
-            status = EvalLeastAbsolute(model_, samples_, at.p, at.a, at.g, &at.cost, work_);
+        if (norm_ == leastSquares)
+            EvalLeastSquares(model_, samples_, at, evaluation_);
+        else if (norm_ == leastAbsolute)
+            status = EvalLeastAbsolute(model_, samples_, at, evaluation_);
         else
-            status = EvalBisquare(model_, samples_, at.p, at.a, at.g, &at.cost, work_);
+            status = EvalBisquare(model_, samples_, at, evaluation_);
         if (status == ErrOutOfMemory)
             return status;
         at.hasFailed = status != 0;
@@ -285,33 +261,31 @@ private:
                (isAtUpper(at.p, i) && at.g[i] < 0.0 && !isFixed(i));
     }
     bool isFixed(int32_t i) const {
-        return bounds_.lower != nullptr && bounds_.upper != nullptr &&
+        return !bounds_.lower.isEmpty() && !bounds_.upper.isEmpty() &&
                bounds_.lower[i] == bounds_.upper[i];
     }
     void freeze(Point &at, int32_t i) const {
         for (int32_t j = 0; j < count_; ++j) {
-            at.a[i * count_ + j] = 0.0;
-            at.a[j * count_ + i] = 0.0;
+            at.a(i, j) = 0.0;
+            at.a(j, i) = 0.0;
         }
-        at.a[i * count_ + i] = 1.0;
+        at.a(i, i) = 1.0;
         if (isAtLower(at.p, i) ? at.g[i] < 0.0 : at.g[i] > 0.0)
             at.g[i] = 0.0;
     }
 
     // The next point to try; the point itself where the equations are not finite.
     ErrorCode propose(double lambda) {
-        Copy(damped_.a, current_.a, std::ptrdiff_t{count_} * count_);
-        Copy(damped_.g, current_.g, count_);
-        for (int32_t i = 0; i < count_; ++i) {
-            DBL &diagonal = damped_.a[i * count_ + i];
-            diagonal = diagonal * (1.0 + lambda) + lambda;
-        }
-        Copy(trial_.p, current_.p, count_);
-        if (CheckFinite(damped_.a, int64_t{count_} * count_) != 0 ||
-            CheckFinite(damped_.g, count_) != 0)
+        const std::ptrdiff_t square = std::ptrdiff_t{count_} * count_;
+        DBL *const a = damped_.a.data(), *const g = damped_.g.data();
+        Copy(a, current_.a.data(), square);
+        Copy(g, current_.g.data(), count_);
+        for (int32_t i = 0; i < count_; ++i)
+            damped_.a(i, i) = damped_.a(i, i) * (1.0 + lambda) + lambda;
+        Copy(trial_.p.data(), current_.p.data(), count_);
+        if (CheckFinite(a, square) != 0 || CheckFinite(g, count_) != 0)
             return 0;
-        if (const ErrorCode failed =
-                SolveRowScaled(damped_.a, damped_.g, count_, pivots_.data(), damped_.p))
+        if (const ErrorCode failed = SolveRowScaled(damped_.a, damped_.g, pivots_, damped_.p))
             return failed;
         for (int32_t i = 0; i < count_; ++i)
             trial_.p[i] += damped_.p[i];
@@ -332,25 +306,27 @@ private:
     const FitModel &model_;
     const FitSamples &samples_;
     const FitBounds &bounds_;
-    const int32_t method_, count_;
+    const FitNorm norm_;
+    const int32_t count_;
     bool isReleasing_ = false;
     Point current_ = {}, trial_ = {}, damped_ = {};
-    DBL *work_ = nullptr;
-    Scratch<ElementType::DBL> memory_;
-    Scratch<ElementType::I32> pivots_;
+    VectorView<ElementType::I32> pivots_;
+    EvaluationMemory evaluation_;
+    ScratchParts memory_;
 };
 
 ErrorCode CheckArguments(const FitModel &model, const FitSamples &samples, int32_t method,
                          const FitBounds &bounds, const DBL *p) {
-    if (samples.n < 1)
+    if (samples.n() < 1)
         return ErrEmptyInput;
-    if (samples.n < model.count)
+    if (samples.n() < model.count)
         return ErrPolynomialOrderTooHigh;
     if (method < leastSquares || method > bisquare)
         return ErrInvalidSelector;
     if (p == nullptr)
         return ErrEmptyInput;
-    for (int32_t i = 0; bounds.lower != nullptr && bounds.upper != nullptr && i < model.count; ++i)
+    const bool areBoth = !bounds.lower.isEmpty() && !bounds.upper.isEmpty();
+    for (int32_t i = 0; areBoth && i < model.count; ++i)
         if (bounds.upper[i] < bounds.lower[i])
             return ErrBoundsCrossed;
     return 0;
@@ -360,10 +336,10 @@ ErrorCode CheckArguments(const FitModel &model, const FitSamples &samples, int32
 
 ErrorCode BoundedLM(const FitModel &model, const FitSamples &samples, int32_t method,
                     const FitBounds &bounds, DBL *p, int32_t *iterations, double tolerance,
-                    double *lambda, DBL *fit, double *mse) {
+                    double *lambda, double *mse) {
     if (const ErrorCode failed = CheckArguments(model, samples, method, bounds, p))
         return failed;
-    Iteration iteration(model, samples, method, bounds);
+    Iteration iteration(model, samples, static_cast<FitNorm>(method), bounds);
     if (const ErrorCode failed = iteration.allocate())
         return failed;
     if (tolerance <= 0.0)
@@ -375,15 +351,15 @@ ErrorCode BoundedLM(const FitModel &model, const FitSamples &samples, int32_t me
     Copy(p, iteration.point(), model.count);
     if (status != 0 && status != ErrIterationLimit)
         return status;
+    *mse = iteration.cost();
+    if (method != bisquare)
+        return status;
     double squares = 0.0;
-    for (int32_t i = 0; (method == bisquare || fit != nullptr) && i < samples.n; ++i) {
-        const double f = model.value(samples.x[i], p, model.count, model.user);
-        const double r = samples.y[i] - f;
-        squares += WeightOf(samples.w, i) * (r * r);
-        if (fit != nullptr)
-            fit[i] = f;
+    for (int32_t i = 0; i < samples.n(); ++i) {
+        const double r = samples.y[i] - model.value(samples.x[i], p, model.count, model.user);
+        squares += samples.weight(i) * (r * r);
     }
-    *mse = method == bisquare ? squares / samples.n : iteration.cost();
+    *mse = squares / samples.n();
     return status;
 }
 

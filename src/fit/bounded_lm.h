@@ -1,21 +1,11 @@
 #ifndef QX_FIT_BOUNDED_LM_H
 #define QX_FIT_BOUNDED_LM_H
 
+#include "fit/limits.h"
 #include "fit/robust_weights.h"
-#include "qx/errors.h"
-
-#include <cstdint>
-#include <limits>
+#include "fit/samples.h"
 
 namespace qx {
-
-// What is fitted: n samples, and weights of which the absolute value counts, or null for none.
-struct FitSamples {
-    const DBL *x;
-    const DBL *y;
-    const DBL *w;
-    int32_t n;
-};
 
 // The model's value at x.
 typedef double (*ModelValue)(double x, const DBL *p, int32_t count, const void *user);
@@ -37,29 +27,48 @@ struct FitModel {
     const void *user;
 };
 
-// One bound per parameter, infinite where there is none; null for no bounds at all. A parameter
+// One bound per parameter, infinite where there is none; empty for no bounds at all. A parameter
 // whose bounds are equal is fixed.
 struct FitBounds {
-    const DBL *lower;
-    const DBL *upper;
+    ConstRealVector lower, upper;
 };
 
-// The cost of a method at p, with a and g as above for the weights that the method gives; g points
-// where the cost falls. The cost is the mean of |w| r^2, of |w r|, or of r^2 times the bisquare
-// weights (fit/robust_weights.h). `work` has EvaluationWork elements; jacobian may be null.
+// The parameters p, and the cost of a method there, with a and g as above for the weights that the
+// method gives; g points where the cost falls.
+struct FitPoint {
+    RealVector p;
+    RealMatrix a;
+    RealVector g;
+    double cost;
+};
+
+// What an evaluation needs beside the point.
+class EvaluationMemory {
+public:
+    EvaluationMemory(const FitModel &model, const FitSamples &samples, FitNorm norm)
+        : state{norm, model.count, samples.w} {}
+    // ErrOutOfMemory.
+    ErrorCode take(int32_t n);
+
+    RealVector gradient, moved;
+    Reweighting state;
+    RealMatrix inverse, jacobian; // bisquare alone
+
+private:
+    ScratchParts memory_;
+};
+
+// The cost is the mean of |w| r^2, of |w r|, or of r^2 times the bisquare weights
+// (fit/robust_weights.h). jacobian may be empty.
 //
 // ErrNaNInData (a residual is NaN), ErrNonFiniteInput (a is not finite), ErrOutOfMemory,
 // ErrIterationLimit (the singular values of a do not converge).
-int64_t EvaluationWork(int32_t n, int32_t count, int32_t method);
-void EvalLeastSquares(const FitModel &model, const FitSamples &samples, const DBL *p, DBL *a,
-                      DBL *jacobian, DBL *g, double *cost, DBL *work);
-ErrorCode EvalLeastAbsolute(const FitModel &model, const FitSamples &samples, const DBL *p, DBL *a,
-                            DBL *g, double *cost, DBL *work);
-ErrorCode EvalBisquare(const FitModel &model, const FitSamples &samples, const DBL *p, DBL *a,
-                       DBL *g, double *cost, DBL *work);
-
-// The largest limit that counts: one step beyond it can still be counted.
-constexpr int32_t mostIterations = std::numeric_limits<int32_t>::max() - 1;
+void EvalLeastSquares(const FitModel &model, const FitSamples &samples, FitPoint &at,
+                      EvaluationMemory &memory, RealMatrix jacobian = {});
+ErrorCode EvalLeastAbsolute(const FitModel &model, const FitSamples &samples, FitPoint &at,
+                            EvaluationMemory &memory);
+ErrorCode EvalBisquare(const FitModel &model, const FitSamples &samples, FitPoint &at,
+                       EvaluationMemory &memory);
 
 // Levenberg-Marquardt iteration from p within the bounds, with the damping a (1 + lambda) + lambda
 // of the diagonal (K. Levenberg, "A method for the solution of certain non-linear problems in least
@@ -73,8 +82,7 @@ constexpr int32_t mostIterations = std::numeric_limits<int32_t>::max() - 1;
 // and such a damping 1. *iterations is the limit, below 0 for none, and becomes the count of steps
 // that were tried after the first. Where the damping has fallen to 0 and the step is worse, all
 // steps up to the limit would be the same, and count without being tried. *lambda becomes the last
-// damping. fit, where not null, takes the model at all x; *mse is the cost, with bisquare the mean
-// of |w| r^2.
+// damping. *mse is the cost, with bisquare the mean of |w| r^2.
 //
 // ErrEmptyInput (no samples, or no p), ErrPolynomialOrderTooHigh (fewer samples than parameters),
 // ErrInvalidSelector (no such method), ErrBoundsCrossed, ErrOutOfMemory, ErrNaNInData (no weights
@@ -82,7 +90,7 @@ constexpr int32_t mostIterations = std::numeric_limits<int32_t>::max() - 1;
 // ErrSingularMatrix (the damped equations have no solution), ErrIterationLimit, with p valid.
 ErrorCode BoundedLM(const FitModel &model, const FitSamples &samples, int32_t method,
                     const FitBounds &bounds, DBL *p, int32_t *iterations, double tolerance,
-                    double *lambda, DBL *fit, double *mse);
+                    double *lambda, double *mse);
 
 } // namespace qx
 

@@ -7,9 +7,13 @@
 
 namespace qx {
 
-ErrorCode SolveRowScaled(DBL *a, DBL *g, int32_t n, I32 *pivots, DBL *d) {
-    for (std::ptrdiff_t i = 0; i < n; ++i) {
-        DBL *const row = a + i * n;
+ErrorCode SolveRowScaled(RealMatrix matrix, RealVector right, VectorView<ElementType::I32> order,
+                         RealVector solution) {
+    const int32_t n = matrix.rows();
+    DBL *const a = matrix.data(), *const g = right.data(), *const d = solution.data();
+    I32 *const pivots = order.data();
+    for (int32_t i = 0; i < n; ++i) {
+        DBL *const row = matrix.row(i);
         double largest = 0.0;
         for (int32_t j = 0; j < n; ++j)
             largest = std::fabs(row[j]) > largest ? std::fabs(row[j]) : largest;
@@ -27,22 +31,20 @@ ErrorCode SolveRowScaled(DBL *a, DBL *g, int32_t n, I32 *pivots, DBL *d) {
     return LUSolve(a, pivots, g, n, 1, d);
 }
 
-ErrorCode AddDampedStep(DBL *a, DBL *g, int32_t n, double lambda, DBL *coefficients) {
-    for (std::ptrdiff_t i = 0; i < n; ++i) {
-        DBL *const diagonal = a + i * n + i;
-        *diagonal *= 1.0 + lambda;
-        if (!std::isfinite(*diagonal))
+ErrorCode AddDampedStep(RealMatrix a, RealVector g, double lambda, RealVector coefficients) {
+    for (int32_t i = 0; i < a.rows(); ++i) {
+        a(i, i) *= 1.0 + lambda;
+        if (!std::isfinite(a(i, i)))
             return ErrNonFiniteInput;
     }
-    Scratch<ElementType::DBL> step;
-    Scratch<ElementType::I32> pivots;
-    if (const ErrorCode failed = step.allocate(n))
+    RealVector step;
+    VectorView<ElementType::I32> pivots;
+    ScratchParts memory;
+    if (const ErrorCode failed = memory.take(Sized(step, a.rows()), Sized(pivots, a.rows())))
         return failed;
-    if (const ErrorCode failed = pivots.allocate(n))
+    if (const ErrorCode failed = SolveRowScaled(a, g, pivots, step))
         return failed;
-    if (const ErrorCode failed = SolveRowScaled(a, g, n, pivots.data(), step.data()))
-        return failed;
-    for (int32_t i = 0; i < n; ++i) {
+    for (int32_t i = 0; i < a.rows(); ++i) {
         coefficients[i] += step[i];
         if (coefficients[i] != coefficients[i])
             return ErrSingularMatrix;

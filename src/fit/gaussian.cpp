@@ -11,9 +11,8 @@ namespace qx {
 
 namespace {
 
-struct Samples {
-    const DBL *x, *y, *w;
-    int32_t n;
+struct GaussianPeak {
+    double amplitude, centre, deviation;
 };
 
 double Bell(const GaussianPeak &peak, double x) {
@@ -22,19 +21,19 @@ double Bell(const GaussianPeak &peak, double x) {
 }
 
 // The first of the elements with the largest modulus.
-int32_t HighestPeak(const Samples &data) {
+int32_t HighestPeak(const FitSamples &data) {
     int32_t best = 0;
-    for (int32_t i = 1; i < data.n; ++i)
+    for (int32_t i = 1; i < data.n(); ++i)
         if (std::fabs(data.y[i]) > std::fabs(data.y[best]))
             best = i;
     return best;
 }
 
 // The sample nearest to the peak on one side, of the sign of the peak; -1 where there is none.
-int32_t Neighbour(const Samples &data, int32_t peak, double side) {
+int32_t Neighbour(const FitSamples &data, int32_t peak, double side) {
     int32_t best = -1;
     double nearest = 0.0;
-    for (int32_t i = 0; i < data.n; ++i) {
+    for (int32_t i = 0; i < data.n(); ++i) {
         const double distance = side * (data.x[i] - data.x[peak]);
         if (!(distance > 0.0) || !(data.y[peak] * data.y[i] > 0.0))
             continue;
@@ -47,7 +46,7 @@ int32_t Neighbour(const Samples &data, int32_t peak, double side) {
 }
 
 // The peak through three points, whose logarithms lie on a parabola.
-ErrorCode ThroughThreePoints(const Samples &data, int32_t peak, GaussianPeak *found) {
+ErrorCode ThroughThreePoints(const FitSamples &data, int32_t peak, GaussianPeak *found) {
     const int32_t below = Neighbour(data, peak, -1.0), above = Neighbour(data, peak, 1.0);
     if (below < 0 || above < 0)
         return ErrFitStartValues;
@@ -63,9 +62,9 @@ ErrorCode ThroughThreePoints(const Samples &data, int32_t peak, GaussianPeak *fo
 }
 
 // Where all that is above a tenth of the peak is as high as the peak.
-GaussianPeak OverPlateau(const Samples &data, int32_t peak) {
+GaussianPeak OverPlateau(const FitSamples &data, int32_t peak) {
     double left = data.x[peak], right = left;
-    for (int32_t i = 0; i < data.n; ++i) {
+    for (int32_t i = 0; i < data.n(); ++i) {
         if (data.y[i] != data.y[peak])
             continue;
         left = data.x[i] < left ? data.x[i] : left;
@@ -76,12 +75,12 @@ GaussianPeak OverPlateau(const Samples &data, int32_t peak) {
 }
 
 // *isExact where the peak is found without iteration.
-ErrorCode Estimate(const Samples &data, GaussianPeak *found, bool *isExact) {
+ErrorCode Estimate(const FitSamples &data, GaussianPeak *found, bool *isExact) {
     const int32_t peak = HighestPeak(data);
     const double height = data.y[peak], x0 = data.x[peak];
     double logarithms = 0.0, squares = 0.0;
     int32_t count = 0;
-    for (int32_t i = 0; i < data.n; ++i) {
+    for (int32_t i = 0; i < data.n(); ++i) {
         const double y = data.y[i];
         if (y == 0.0 || !(std::fabs(y) > 0.1 * std::fabs(height)))
             continue;
@@ -100,24 +99,24 @@ ErrorCode Estimate(const Samples &data, GaussianPeak *found, bool *isExact) {
 
 class Descent {
 public:
-    Descent(const Samples &data, DBL *bells) : data_(data), bells_(bells) {}
+    Descent(const FitSamples &data, RealVector bells) : data_(data), bells_(bells) {}
 
     double mseAt(const GaussianPeak &peak) {
-        SquaredResiduals squares(data_.w);
-        for (int32_t i = 0; i < data_.n; ++i) {
+        SquaredResiduals squares(data_);
+        for (int32_t i = 0; i < data_.n(); ++i) {
             bells_[i] = Bell(peak, data_.x[i]);
-            squares.add(i, data_.y[i], peak.amplitude * bells_[i]);
+            squares.add(i, peak.amplitude * bells_[i]);
         }
-        return squares.mean(data_.n);
+        return squares.mean();
     }
 
     // Half the negative gradient of the sum of squares, for the peak that mseAt was asked for last.
     GaussianPeak direction(const GaussianPeak &at) const {
         GaussianPeak sum = {};
-        for (int32_t i = 0; i < data_.n; ++i) {
+        for (int32_t i = 0; i < data_.n(); ++i) {
             const double value = at.amplitude * bells_[i];
             const double rest = data_.y[i] - value;
-            const double r = data_.w == nullptr ? rest : std::fabs(data_.w[i]) * rest;
+            const double r = data_.w.isEmpty() ? rest : std::fabs(data_.w[i]) * rest;
             const double away = data_.x[i] - at.centre;
             const double slope = away * value / (at.deviation * at.deviation);
             sum.amplitude += r * bells_[i];
@@ -160,55 +159,45 @@ public:
     }
 
 private:
-    const Samples &data_;
-    DBL *bells_;
+    const FitSamples &data_;
+    const RealVector bells_;
 };
 
-ErrorCode FindPeak(const Samples &data, const DBL *guess, const FitLimits &limits,
-                   GaussianPeak *peak, int32_t *steps) {
+ErrorCode FindPeak(const FitSamples &data, const ModelFit &request, GaussianPeak *peak) {
+    const DBL *const guess = request.guess;
     bool isExact = false;
     if (guess != nullptr && CheckFinite(guess, 3) == 0)
         *peak = {guess[0], guess[1], guess[2]};
     else if (const ErrorCode failed = Estimate(data, peak, &isExact))
         return failed;
-    *steps = 0;
+    *request.steps = 0;
     if (isExact)
         return 0;
     if (peak->deviation == 0.0)
         return ErrFitStartValues;
     Scratch<ElementType::DBL> bells;
-    if (const ErrorCode failed = bells.allocate(data.n))
+    if (const ErrorCode failed = bells.allocate(data.n()))
         return failed;
-    Descent(data, bells.data()).run(limits.settled(), peak, steps);
+    Descent(data, {bells.data(), data.n()}).run(request.limits.settled(), peak, request.steps);
     return 0;
 }
 
 } // namespace
 
-ErrorCode FitGaussian(const DBL *x, const DBL *y, const DBL *w, int32_t n, DBL *fit, DBL *a, DBL *c,
-                      DBL *s, DBL *mse, const DBL *guess, const FitLimits &limits, int32_t *steps) {
-    if (const ErrorCode failed = SettleWeights(n, 3, &w))
+ErrorCode FitGaussian(const ModelFit &request) {
+    FitSamples data = request.samples;
+    if (const ErrorCode failed = SettleWeights(&data, 3))
         return failed;
-    if (CheckFinite(x, n) != 0)
+    if (CheckFinite(data.x.data(), data.n()) != 0)
         return ErrNonFiniteInput;
-    const Samples data = {x, y, w, n};
     GaussianPeak peak = {};
-    if (const ErrorCode failed = FindPeak(data, guess, limits, &peak, steps))
+    if (const ErrorCode failed = FindPeak(data, request, &peak))
         return failed;
-    *a = peak.amplitude;
-    *c = peak.centre;
-    *s = std::fabs(peak.deviation);
-    if (fit == nullptr && mse == nullptr)
-        return 0;
-    SquaredResiduals squares(w);
-    for (int32_t i = 0; i < n; ++i) {
-        const double f = peak.amplitude * Bell(peak, x[i]);
-        squares.add(i, y[i], f);
-        if (fit != nullptr)
-            fit[i] = f;
-    }
-    if (mse != nullptr)
-        *mse = squares.mean(n);
+    EvaluateFit(data, request.out,
+                [&](int32_t i) { return peak.amplitude * Bell(peak, data.x[i]); });
+    request.p[0] = peak.amplitude;
+    request.p[1] = peak.centre;
+    request.p[2] = std::fabs(peak.deviation);
     return 0;
 }
 

@@ -111,7 +111,7 @@ ErrorCode SolveByTriangle(const LinearModel &model, const Elimination &triangle,
     for (int32_t i = 0; i < k; ++i)
         c[i] = triangle.target(i);
     if (const ErrorCode failed =
-            SolveUpperTriangular(triangle.row(0), triangle.stride(), c, k, nullptr))
+            SolveUpperTriangular({triangle.row(0), k, k, triangle.stride()}, {c, k}, {c, k}))
         return failed;
     if (covariance == nullptr)
         return 0;
@@ -193,39 +193,36 @@ ErrorCode SolveLinearModel(const LinearModel &model, int32_t method, DBL *c, DBL
     return SolveByTriangle(model, triangle, c, covariance);
 }
 
-ErrorCode FitGeneral(const DBL *h, int32_t n, int32_t k, const DBL *y, const DBL *w, DBL *c,
-                     DBL *fit, DBL *mse, DBL *covariance, int32_t algorithm) {
-    const auto writeRows = [=](const RowBlock &block) {
+ErrorCode FitGeneral(ConstRealMatrix h, const FitSamples &samples, int32_t algorithm, RealVector c,
+                     RealMatrix covariance, const FitOutput &out) {
+    const int32_t n = h.rows(), k = h.cols();
+    const auto writeRows = [&](const RowBlock &block) {
         const auto bytes = static_cast<std::size_t>(block.count) * sizeof(DBL);
-        TransposeInto(h + std::ptrdiff_t{block.first} * k, block.count, k, block.start);
-        std::memcpy(block.column(k), y + block.first, bytes);
+        TransposeInto(h.row(block.first), block.count, k, block.start);
+        std::memcpy(block.column(k), samples.y.data() + block.first, bytes);
     };
-    if (const ErrorCode status = SolveLinearModel({writeRows, n, k, w}, algorithm, c, covariance))
+    DBL *const wanted = covariance.isEmpty() ? nullptr : covariance.data();
+    if (const ErrorCode status =
+            SolveLinearModel({writeRows, n, k, samples.weights()}, algorithm, c.data(), wanted))
         return status;
-    if (fit == nullptr || mse == nullptr)
-        return 0;
-    SquaredResiduals squares(w);
-    for (std::ptrdiff_t i = 0; i < n; ++i) {
+    EvaluateFit(samples, out, [&](int32_t i) {
         double f = 0.0;
-        for (std::ptrdiff_t j = 0; j < k; ++j)
-            f += h[i * k + j] * c[j];
-        squares.add(static_cast<int32_t>(i), y[i], f);
-        fit[i] = f;
-    }
-    *mse = squares.mean(n);
+        for (int32_t j = 0; j < k; ++j)
+            f += h(i, j) * c[j];
+        return f;
+    });
     return 0;
 }
 
-ErrorCode SolveUpperTriangular(const DBL *r, std::ptrdiff_t stride, DBL *v, int32_t k, DBL *x) {
-    DBL *const solution = x == nullptr ? v : x;
-    for (std::ptrdiff_t i = k - 1; i >= 0; --i) {
-        const DBL *const row = r + i * stride;
+ErrorCode SolveUpperTriangular(ConstRealMatrix r, ConstRealVector v, RealVector x) {
+    for (std::ptrdiff_t i = r.rows() - 1; i >= 0; --i) {
+        const DBL *const row = r.row(i);
         if (row[i] == 0.0 || row[i] != row[i])
             return ErrSingularMatrix;
         double tail = 0.0;
-        for (std::ptrdiff_t j = i + 1; j < k; ++j)
-            tail += row[j] * solution[j];
-        solution[i] = (v[i] - tail) / row[i];
+        for (std::ptrdiff_t j = i + 1; j < r.rows(); ++j)
+            tail += row[j] * x[j];
+        x[i] = (v[i] - tail) / row[i];
     }
     return 0;
 }

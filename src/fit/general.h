@@ -2,6 +2,7 @@
 #define QX_FIT_GENERAL_H
 
 #include "fit/model_rows.h"
+#include "fit/samples.h"
 #include "qx/errors.h"
 
 namespace qx {
@@ -25,14 +26,14 @@ enum LeastSquaresMethod : int32_t {
 // ErrIterationLimit.
 ErrorCode SolveLinearModel(const LinearModel &model, int32_t method, DBL *c, DBL *covariance);
 
-// The same for a row-major matrix H, n by k. Where both fit and mse are given, H c and its
-// WeightedMSE as well; fit may be y.
-ErrorCode FitGeneral(const DBL *h, int32_t n, int32_t k, const DBL *y, const DBL *w, DBL *c,
-                     DBL *fit, DBL *mse, DBL *covariance, int32_t algorithm);
+// The same for a matrix h of n rows and k columns, with the covariance where that is not empty, and
+// the values h c and their MSE.
+ErrorCode FitGeneral(ConstRealMatrix h, const FitSamples &samples, int32_t algorithm, RealVector c,
+                     RealMatrix covariance, const FitOutput &out);
 
-// Solves r x = v for the upper triangle of order k of a row-major matrix; x null is in place of
-// v. ErrSingularMatrix where a diagonal element is 0 or NaN.
-ErrorCode SolveUpperTriangular(const DBL *r, std::ptrdiff_t stride, DBL *v, int32_t k, DBL *x);
+// Solves r x = v for the upper triangle of a square matrix; x may be v. ErrSingularMatrix where a
+// diagonal element is 0 or NaN.
+ErrorCode SolveUpperTriangular(ConstRealMatrix r, ConstRealVector v, RealVector x);
 
 } // namespace qx
 

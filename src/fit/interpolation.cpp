@@ -8,25 +8,26 @@ namespace qx {
 
 namespace {
 
-typedef Scratch<ElementType::DBL> Column;
-
 // A tableau of corrections: the columns c and d, both y at first, d moved by an offset.
-ErrorCode StartTableau(const Table &table, Column &c, Column &d, double offset) {
-    if (const ErrorCode failed = c.allocate(table.n))
-        return failed;
-    if (const ErrorCode failed = d.allocate(table.n))
-        return failed;
-    for (int32_t i = 0; i < table.n; ++i) {
-        c[i] = table.y[i];
-        d[i] = table.y[i] + offset;
+struct Tableau {
+    RealVector c, d;
+    ScratchParts memory;
+
+    ErrorCode start(const Table &table, double offset) {
+        if (const ErrorCode failed = memory.take(Sized(c, table.n()), Sized(d, table.n())))
+            return failed;
+        for (int32_t i = 0; i < table.n(); ++i) {
+            c[i] = table.y[i];
+            d[i] = table.y[i] + offset;
+        }
+        return 0;
     }
-    return 0;
-}
+};
 
 int32_t NearestPoint(const Table &table, double xi) {
     int32_t nearest = 0;
     double least = std::fabs(xi - table.x[0]);
-    for (int32_t i = 1; i < table.n; ++i) {
+    for (int32_t i = 1; i < table.n(); ++i) {
         const double distance = std::fabs(xi - table.x[i]);
         if (distance < least) {
             least = distance;
@@ -39,16 +40,16 @@ int32_t NearestPoint(const Table &table, double xi) {
 // Goes through the tableau from the nearest point, always to the correction that keeps the points
 // in use centred on xi. `advance(i, m)` replaces c[i] and d[i] by those of column m.
 template <class Advance>
-ErrorCode WalkTableau(const Table &table, int32_t nearest, Column &c, Column &d, double *yi,
+ErrorCode WalkTableau(const Table &table, int32_t nearest, const Tableau &tableau, double *yi,
                       double *dy, const Advance &advance) {
     int32_t at = nearest - 1;
     double sum = table.y[nearest];
     double correction = 0.0;
-    for (int32_t m = 1; m < table.n; ++m) {
-        for (int32_t i = 0; i < table.n - m; ++i)
+    for (int32_t m = 1; m < table.n(); ++m) {
+        for (int32_t i = 0; i < table.n() - m; ++i)
             if (const ErrorCode bad = advance(i, m))
                 return bad;
-        correction = 2 * (int64_t{at} + 1) < table.n - m ? c[at + 1] : d[at--];
+        correction = 2 * (int64_t{at} + 1) < table.n() - m ? tableau.c[at + 1] : tableau.d[at--];
         sum += correction;
     }
     *yi = sum;
@@ -56,17 +57,26 @@ ErrorCode WalkTableau(const Table &table, int32_t nearest, Column &c, Column &d,
     return 0;
 }
 
+// A slope that is larger, or NaN, asks for a natural end.
+bool IsSlope(double slope) { return slope <= 9.9e+29; }
+
+ErrorCode CheckAbscissae(ConstRealVector x) {
+    for (std::ptrdiff_t i = 1; i < x.size(); ++i)
+        if (x[i] == x[i - 1] || (i > 1 && x[i] == x[i - 2]))
+            return ErrAbscissaeOrder;
+    return 0;
+}
+
 } // namespace
 
 ErrorCode InterpolateByPolynomial(const Table &table, double xi, double *yi, double *dy) {
-    if (table.n < 1)
-        return ErrEmptyInput;
-    Column c;
-    Column d;
-    if (const ErrorCode failed = StartTableau(table, c, d, 0.0))
+    QX_EXPECTS(table.n() > 0);
+    Tableau tableau;
+    if (const ErrorCode failed = tableau.start(table, 0.0))
         return failed;
-    const DBL *x = table.x;
-    return WalkTableau(table, NearestPoint(table, xi), c, d, yi, dy, [&](int32_t i, int32_t m) {
+    const auto &[c, d, memory] = tableau;
+    const ConstRealVector x = table.x;
+    return WalkTableau(table, NearestPoint(table, xi), tableau, yi, dy, [&](int32_t i, int32_t m) {
         if (x[i + m] == x[i])
             return ErrorCode{ErrAbscissaeOrder};
         const double quotient = (c[i + 1] - d[i]) / (x[i] - x[i + m]);
@@ -77,20 +87,19 @@ ErrorCode InterpolateByPolynomial(const Table &table, double xi, double *yi, dou
 }
 
 ErrorCode InterpolateByRational(const Table &table, double xi, double *yi, double *dy) {
-    if (table.n < 1)
-        return ErrEmptyInput;
-    const DBL *x = table.x;
+    QX_EXPECTS(table.n() > 0);
+    const ConstRealVector x = table.x;
     const int32_t nearest = NearestPoint(table, xi);
     if (std::fabs(xi - x[nearest]) == 0.0) {
         *yi = table.y[nearest];
         *dy = 0.0;
         return 0;
     }
-    Column c;
-    Column d;
-    if (const ErrorCode failed = StartTableau(table, c, d, 1e-10)) // against 0 / 0 in the tableau
+    Tableau tableau;
+    if (const ErrorCode failed = tableau.start(table, 1e-10)) // against 0 / 0 in the tableau
         return failed;
-    return WalkTableau(table, nearest, c, d, yi, dy, [&](int32_t i, int32_t m) {
+    const auto &[c, d, memory] = tableau;
+    return WalkTableau(table, nearest, tableau, yi, dy, [&](int32_t i, int32_t m) {
         const double difference = c[i + 1] - d[i];
         const double t = (x[i] - xi) * d[i] / (x[i + m] - xi);
         const double denominator = t - c[i + 1];
@@ -103,32 +112,19 @@ ErrorCode InterpolateByRational(const Table &table, double xi, double *yi, doubl
     });
 }
 
-namespace {
-
-// A slope that is larger, or NaN, asks for a natural end.
-bool IsSlope(double slope) { return slope <= 9.9e+29; }
-
-ErrorCode CheckAbscissae(const DBL *x, int32_t n) {
-    for (int32_t i = 1; i < n; ++i)
-        if (x[i] == x[i - 1] || (i > 1 && x[i] == x[i - 2]))
-            return ErrAbscissaeOrder;
-    return 0;
-}
-
-} // namespace
-
 // The tridiagonal system of the spline, by one pass forward, which leaves the ratios of the
 // elimination in s and the right side in u, and one backward.
-ErrorCode SplineSecondDerivatives(const Table &table, double firstSlope, double lastSlope, DBL *s) {
-    const auto [x, y, n] = table;
-    if (n < 1)
-        return ErrEmptyInput;
-    if (const ErrorCode bad = CheckAbscissae(x, n))
+ErrorCode SplineSecondDerivatives(const Table &table, double firstSlope, double lastSlope,
+                                  RealVector s) {
+    const auto [x, y] = table;
+    const int32_t n = table.n();
+    QX_EXPECTS(n > 0);
+    if (const ErrorCode bad = CheckAbscissae(x))
         return bad;
     s[0] = 0.0;
     if (n == 1) // no segment
         return 0;
-    Column u;
+    Scratch<ElementType::DBL> u;
     if (const ErrorCode failed = u.allocate(n))
         return failed;
     u[0] = 0.0;
@@ -154,10 +150,10 @@ ErrorCode SplineSecondDerivatives(const Table &table, double firstSlope, double 
     return 0;
 }
 
-ErrorCode InterpolateBySpline(const Table &table, const DBL *s, double xi, double *yi) {
-    const auto [x, y, n] = table;
-    if (n < 1)
-        return ErrEmptyInput;
+ErrorCode InterpolateBySpline(const Table &table, ConstRealVector s, double xi, double *yi) {
+    const auto [x, y] = table;
+    const int32_t n = table.n();
+    QX_EXPECTS(n > 0);
     const bool ascends = x[n - 1] > x[0];
     int32_t lo = 0;
     int32_t hi = n - 1;

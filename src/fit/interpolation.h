@@ -1,21 +1,22 @@
 #ifndef QX_FIT_INTERPOLATION_H
 #define QX_FIT_INTERPOLATION_H
 
+#include "frame/views.h"
 #include "qx/errors.h"
-#include "qx/types.h"
 
 namespace qx {
 
-// A table of n points. include/qx/interpolation.h tells what they compute and their codes.
+// A table of at least one point, as many x as y. include/qx/interpolation.h has what is computed
+// and the codes.
 struct Table {
-    const DBL *x;
-    const DBL *y;
-    int32_t n;
+    ConstRealVector x, y;
+    int32_t n() const { return static_cast<int32_t>(x.size()); }
 };
 ErrorCode InterpolateByPolynomial(const Table &table, double xi, double *yi, double *dy);
 ErrorCode InterpolateByRational(const Table &table, double xi, double *yi, double *dy);
-ErrorCode SplineSecondDerivatives(const Table &table, double firstSlope, double lastSlope, DBL *s);
-ErrorCode InterpolateBySpline(const Table &table, const DBL *s, double xi, double *yi);
+ErrorCode SplineSecondDerivatives(const Table &table, double firstSlope, double lastSlope,
+                                  RealVector s);
+ErrorCode InterpolateBySpline(const Table &table, ConstRealVector s, double xi, double *yi);
 
 } // namespace qx
 

@@ -11,9 +11,11 @@ namespace qx {
 namespace {
 
 // Products stand in arrays of their own, which the compiler vectorises.
-LineSums WeightedSums(const DBL *x, const DBL *y, int32_t n, const DBL *w) {
+LineSums WeightedSums(const FitSamples &samples) {
     constexpr int32_t chunk = 64;
-    const double largest = LargestWeight(w, n);
+    const auto &[x, y, w] = samples;
+    const int32_t n = samples.n();
+    const double largest = LargestWeight(w.data(), n);
     LineSums sums = {};
     double v[chunk], vx[chunk], vy[chunk], vxy[chunk], vxx[chunk];
     for (int32_t from = 0; from < n; from += chunk) {
@@ -38,43 +40,37 @@ LineSums WeightedSums(const DBL *x, const DBL *y, int32_t n, const DBL *w) {
 
 } // namespace
 
-LineSums SumsOfLine(const DBL *x, const DBL *y, int32_t n, const DBL *w) {
-    if (w != nullptr)
-        return WeightedSums(x, y, n, w);
+LineSums SumsOfLine(const FitSamples &samples) {
+    if (!samples.w.isEmpty())
+        return WeightedSums(samples);
+    const DBL *const x = samples.x.data(), *const y = samples.y.data();
     LineSums sums = {};
-    for (int32_t i = 0; i < n; ++i) {
+    for (int32_t i = 0; i < samples.n(); ++i) {
         sums.x += x[i];
         sums.y += y[i];
         sums.xx += x[i] * x[i];
         sums.xy += x[i] * y[i];
     }
-    sums.weight = n;
+    sums.weight = samples.n();
     return sums;
 }
 
-ErrorCode FitLine(const DBL *x, const DBL *y, int32_t n, const DBL *w, DBL *fit, DBL *slope,
-                  DBL *intercept, DBL *mse) {
-    if (const ErrorCode failed = SettleWeights(n, 2, &w))
-        return failed;
-    const LineSums s = SumsOfLine(x, y, n, w);
+Line LineThrough(const FitSamples &samples) {
+    const LineSums s = SumsOfLine(samples);
     const double determinant = s.x * s.x - s.xx * s.weight;
     const double a = (s.y * s.x - s.xy * s.weight) / determinant;
     // kept: two forms of the same number, which differ in their last bits
     const double b =
-        w == nullptr ? (s.x * s.xy - s.xx * s.y) / determinant : (s.y - a * s.x) / s.weight;
-    *slope = a;
-    *intercept = b;
-    if (fit == nullptr && mse == nullptr)
-        return 0;
-    SquaredResiduals squares(w);
-    for (int32_t i = 0; i < n; ++i) {
-        const double f = x[i] * a + b;
-        squares.add(i, y[i], f);
-        if (fit != nullptr)
-            fit[i] = f;
-    }
-    if (mse != nullptr)
-        *mse = squares.mean(n);
+        samples.w.isEmpty() ? (s.x * s.xy - s.xx * s.y) / determinant : (s.y - a * s.x) / s.weight;
+    return {a, b};
+}
+
+ErrorCode FitLine(FitSamples samples, Line *line, const FitOutput &out) {
+    if (const ErrorCode failed = SettleWeights(&samples, 2))
+        return failed;
+    const Line found = LineThrough(samples);
+    EvaluateFit(samples, out, [&](int32_t i) { return found.at(samples.x[i]); });
+    *line = found;
     return 0;
 }
 

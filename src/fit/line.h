@@ -1,23 +1,28 @@
 #ifndef QX_FIT_LINE_H
 #define QX_FIT_LINE_H
 
+#include "fit/samples.h"
 #include "qx/errors.h"
-#include "qx/types.h"
 
 namespace qx {
+
+struct Line {
+    double slope, intercept;
+    double at(double x) const { return slope * x + intercept; }
+};
 
 // The sums of a line fit, each in one accumulator from the first sample to the last. Weights are
 // taken as |w| / max |w|; without them `weight` is n.
 struct LineSums {
     double weight, x, y, xy, xx;
 };
-LineSums SumsOfLine(const DBL *x, const DBL *y, int32_t n, const DBL *w);
+LineSums SumsOfLine(const FitSamples &samples);
 
-// y = slope x + intercept by least squares, from the closed formula: equal abscissae give NaN or
-// infinities and no failure. `fit` gets the line's values and may be y; it may be null, and so may
-// mse. Weights: SettleWeights.
-ErrorCode FitLine(const DBL *x, const DBL *y, int32_t n, const DBL *w, DBL *fit, DBL *slope,
-                  DBL *intercept, DBL *mse);
+// The line of least squares, from the closed formula: equal abscissae give NaN or infinities.
+Line LineThrough(const FitSamples &samples);
+
+// The same with settled weights (SettleWeights, which has the codes), and its values.
+ErrorCode FitLine(FitSamples samples, Line *line, const FitOutput &out);
 
 } // namespace qx
 

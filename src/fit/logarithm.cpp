@@ -31,49 +31,38 @@ double LogBase::power(double exponent) const {
     return kind_ == Kind::Natural ? std::exp(exponent) : std::pow(base_, exponent);
 }
 
-double SameSign(const DBL *x, int32_t n) {
-    int32_t positive = 0, negative = 0;
-    for (int32_t i = 0; i < n; ++i) {
-        positive += x[i] > 0.0;
-        negative += x[i] < 0.0;
+double SameSign(ConstRealVector x) {
+    std::ptrdiff_t positive = 0, negative = 0;
+    for (const double v : x) {
+        positive += v > 0.0;
+        negative += v < 0.0;
     }
-    if (positive == n)
+    if (positive == x.size())
         return 1.0;
-    return negative == n ? -1.0 : 0.0;
+    return negative == x.size() ? -1.0 : 0.0;
 }
 
-ErrorCode FitLog(const DBL *x, const DBL *y, const DBL *w, int32_t n, DBL *fit, double base, DBL *a,
-                 DBL *b, DBL *mse) {
+ErrorCode FitLog(FitSamples samples, double base, DBL *p, const FitOutput &out) {
     if (base <= 0.0)
         return ErrNotStrictlyPositive;
-    if (const ErrorCode failed = SettleWeights(n, 2, &w))
+    if (const ErrorCode failed = SettleWeights(&samples, 2))
         return failed;
-    const double sign = SameSign(x, n);
+    const double sign = SameSign(samples.x);
     if (sign == 0.0)
         return ErrMixedSigns;
     const LogBase logarithm(base);
     Scratch<ElementType::DBL> t;
-    if (const ErrorCode failed = t.allocate(n))
+    if (const ErrorCode failed = t.allocate(samples.n()))
         return failed;
-    for (int32_t i = 0; i < n; ++i)
-        t[i] = logarithm.log(sign * x[i]);
-    DBL slope, intercept;
-    if (const ErrorCode failed = FitLine(t.data(), y, n, w, nullptr, &slope, &intercept, nullptr))
-        return failed;
-    *a = slope;
-    *b = slope == 0.0 ? sign : sign * logarithm.power(intercept / slope);
-    if (fit == nullptr && mse == nullptr)
-        return 0;
-    const double factor = *b;
-    SquaredResiduals squares(w);
-    for (int32_t i = 0; i < n; ++i) {
-        const double f = slope * logarithm.log(factor * x[i]);
-        squares.add(i, y[i], f);
-        if (fit != nullptr)
-            fit[i] = f;
-    }
-    if (mse != nullptr)
-        *mse = squares.mean(n);
+    for (int32_t i = 0; i < samples.n(); ++i)
+        t[i] = logarithm.log(sign * samples.x[i]);
+    const Line line = LineThrough({{t.data(), samples.n()}, samples.y, samples.w});
+    const double slope = line.slope;
+    const double factor = slope == 0.0 ? sign : sign * logarithm.power(line.intercept / slope);
+    EvaluateFit(samples, out,
+                [&](int32_t i) { return slope * logarithm.log(factor * samples.x[i]); });
+    p[0] = slope;
+    p[1] = factor;
     return 0;
 }
 

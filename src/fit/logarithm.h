@@ -1,8 +1,8 @@
 #ifndef QX_FIT_LOGARITHM_H
 #define QX_FIT_LOGARITHM_H
 
+#include "fit/samples.h"
 #include "qx/errors.h"
-#include "qx/types.h"
 
 namespace qx {
 
@@ -21,14 +21,13 @@ private:
 };
 
 // +1 where all x are above 0, -1 where all are below, else 0.
-double SameSign(const DBL *x, int32_t n);
+double SameSign(ConstRealVector x);
 
-// y = a log_base(b x) by the line through (log_base |x|, y), for x of one sign, which b takes.
-// `fit` may be y; it may be null, and so may mse.
+// y = p[0] log_base(p[1] x) by the line through (log_base |x|, y), for x of one sign, which p[1]
+// takes.
 //
 // ErrNotStrictlyPositive (base <= 0), codes of SettleWeights, ErrMixedSigns, ErrOutOfMemory.
-ErrorCode FitLog(const DBL *x, const DBL *y, const DBL *w, int32_t n, DBL *fit, double base, DBL *a,
-                 DBL *b, DBL *mse);
+ErrorCode FitLog(FitSamples samples, double base, DBL *p, const FitOutput &out);
 
 } // namespace qx
 

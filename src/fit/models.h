@@ -63,10 +63,10 @@ void NormalEquations(const FitSamples &samples, const DBL *p, int32_t, double *m
     double products[count][count] = {};
     double slopes[count] = {};
     double squares = 0.0;
-    for (int32_t k = 0; k < samples.n; ++k) {
+    for (int32_t k = 0; k < samples.n(); ++k) {
         double d[count];
         const double r = samples.y[k] - Model::evaluate(samples.x[k], p, user, d);
-        const double weight = samples.w == nullptr ? 1.0 : std::fabs(samples.w[k]);
+        const double weight = samples.weight(k);
         squares += weight * (r * r);
         for (int32_t i = 0; i < count; ++i) {
             const double weighted = weight * d[i];
@@ -77,7 +77,7 @@ void NormalEquations(const FitSamples &samples, const DBL *p, int32_t, double *m
         for (int32_t i = 0; jacobian != nullptr && i < count; ++i)
             jacobian[std::ptrdiff_t{k} * count + i] = d[i];
     }
-    *mse = squares / samples.n;
+    *mse = squares / samples.n();
     for (int32_t i = 0; i < count; ++i) {
         g[i] = slopes[i];
         for (int32_t j = 0; j < count; ++j)
@@ -94,8 +94,8 @@ void NormalEquationsInLanes(const FitSamples &samples, const DBL *p, int32_t cou
         return;
     }
     DBL sums[SumsOfModel(Model::count)];
-    Model::inLanes(samples.x, samples.y, samples.w, samples.n, p, sums);
-    *mse = sums[0] / samples.n;
+    Model::inLanes(samples.x.data(), samples.y.data(), samples.weights(), samples.n(), p, sums);
+    *mse = sums[0] / samples.n();
     const DBL *next = sums + 1;
     for (int32_t i = 0; i < Model::count; ++i) {
         for (int32_t j = 0; j <= i; ++j)

@@ -15,17 +15,17 @@ constexpr int32_t highestFitted = 25;
 // Which terms are fitted, and what the others are.
 class Terms {
 public:
-    ErrorCode make(int32_t order, const I32 *fixedOrders, int32_t fixedCount) {
+    ErrorCode make(int32_t order, const FixedTerms &fixed) {
         if (const ErrorCode failed = kinds_.allocate(int64_t{order} + 1))
             return failed;
         for (int32_t j = 0; j <= order; ++j)
             kinds_[j] = isFree;
-        for (int32_t i = 0; i < fixedCount; ++i)
-            if (0 <= fixedOrders[i] && fixedOrders[i] <= order)
-                kinds_[fixedOrders[i]] = i;
+        for (int32_t i = 0; i < fixed.count(); ++i)
+            if (0 <= fixed.orders[i] && fixed.orders[i] <= order)
+                kinds_[fixed.orders[i]] = i;
         if (order > highestFitted) {
             isCapped_ = true;
-            const int32_t limit = fixedCount > 0 ? limitBeside(order) : highestFitted;
+            const int32_t limit = fixed.count() > 0 ? limitBeside(order) : highestFitted;
             for (int32_t j = limit + 1; j <= order; ++j)
                 kinds_[j] = kinds_[j] == isFree ? int32_t{isZero} : kinds_[j];
         }
@@ -65,8 +65,8 @@ constexpr int32_t chunk = 64;
 // The free powers of x, and y without the fixed terms.
 class PolynomialRows {
 public:
-    PolynomialRows(const Terms &terms, const DBL *x, const DBL *y, const DBL *fixedValues)
-        : terms_(terms), x_(x), y_(y), fixedValues_(fixedValues) {}
+    PolynomialRows(const Terms &terms, const FitSamples &samples, const FixedTerms &fixed)
+        : terms_(terms), samples_(samples), fixed_(fixed) {}
 
     void operator()(const RowBlock &block) const {
         for (int32_t from = 0; from < block.count; from += chunk)
@@ -75,7 +75,8 @@ public:
 
 private:
     void write(const RowBlock &block, int32_t from, int32_t count) const {
-        const DBL *const x = x_ + block.first + from, *const y = y_ + block.first + from;
+        const std::ptrdiff_t first = block.first + from;
+        const DBL *const x = samples_.x.data() + first, *const y = samples_.y.data() + first;
         double power[chunk], fixed[chunk];
         for (int32_t i = 0; i < count; ++i) {
             power[i] = 1.0;
@@ -90,7 +91,7 @@ private:
                 for (int32_t i = 0; i < count; ++i)
                     to[i] = power[i];
             } else if (terms_.isFixedAt(j)) {
-                const double value = fixedValues_[terms_.fixedAt(j)];
+                const double value = fixed_.values[terms_.fixedAt(j)];
                 for (int32_t i = 0; i < count; ++i)
                     fixed[i] += value * power[i];
             }
@@ -101,11 +102,12 @@ private:
     }
 
     const Terms &terms_;
-    const DBL *x_, *y_, *fixedValues_;
+    const FitSamples &samples_;
+    const FixedTerms &fixed_;
 };
 
 ErrorCode SolveFreeTerms(const LinearModel &model, int32_t algorithm, FitNorm norm,
-                         RobustLimits limits, DBL *c) {
+                         const FitLimits &limits, DBL *c) {
     if (model.k == 0)
         return 0;
     return norm == leastSquares ? SolveLinearModel(model, algorithm, c, nullptr)
@@ -113,63 +115,61 @@ ErrorCode SolveFreeTerms(const LinearModel &model, int32_t algorithm, FitNorm no
 }
 
 // The solution stands in the first elements of c and is spread out from its end.
-void PlaceTerms(const Terms &terms, int32_t order, const DBL *fixedValues, DBL *c) {
+void PlaceTerms(const Terms &terms, const FixedTerms &fixed, RealVector c) {
     int32_t next = terms.freeCount();
-    for (int32_t j = order; j >= 0; --j) {
+    for (auto j = static_cast<int32_t>(c.size()) - 1; j >= 0; --j) {
         if (terms.isFreeAt(j))
             c[j] = c[--next];
         else
-            c[j] = terms.isFixedAt(j) ? fixedValues[terms.fixedAt(j)] : 0.0;
+            c[j] = terms.isFixedAt(j) ? fixed.values[terms.fixedAt(j)] : 0.0;
     }
 }
 
 // Horner's rule from the highest term down, and the MSE.
-void Evaluate(const DBL *x, const DBL *y, const DBL *w, int32_t n, const DBL *c, int32_t order,
-              DBL *fit, DBL *mse) {
-    SquaredResiduals squares(w);
+void Evaluate(const FitSamples &samples, ConstRealVector c, const FitOutput &out) {
+    SquaredResiduals squares(samples);
     double f[chunk];
-    for (int32_t from = 0; from < n; from += chunk) {
-        const int32_t count = std::min(chunk, n - from);
+    for (int32_t from = 0; from < samples.n(); from += chunk) {
+        const int32_t count = std::min(chunk, samples.n() - from);
+        const DBL *const x = samples.x.data() + from;
         for (int32_t i = 0; i < count; ++i)
-            f[i] = c[order];
-        for (int32_t j = order - 1; j >= 0; --j)
+            f[i] = c[c.size() - 1];
+        for (std::ptrdiff_t j = c.size() - 2; j >= 0; --j)
             for (int32_t i = 0; i < count; ++i)
-                f[i] = f[i] * x[from + i] + c[j];
+                f[i] = f[i] * x[i] + c[j];
         for (int32_t i = 0; i < count; ++i) {
-            squares.add(from + i, y[from + i], f[i]);
-            fit[from + i] = f[i];
+            squares.add(from + i, f[i]);
+            out.values[from + i] = f[i];
         }
     }
-    if (mse != nullptr)
-        *mse = squares.mean(n);
+    if (out.mse != nullptr)
+        *out.mse = squares.mean();
 }
 
 } // namespace
 
 ErrorCode CheckPolynomialOrder(int32_t n, int32_t order, int32_t fixedCount) {
-    if (fixedCount < 0 || order < 0)
+    if (order < 0)
         return ErrPolynomialOrderNegative;
     return n <= order - fixedCount ? ErrPolynomialOrderTooHigh : 0;
 }
 
-ErrorCode FitPolynomial(const DBL *x, const DBL *y, const DBL *w, int32_t n, int32_t order,
-                        int32_t algorithm, const I32 *fixedOrders, const DBL *fixedValues,
-                        int32_t fixedCount, DBL *fit, DBL *coefficients, DBL *mse, FitNorm norm,
-                        RobustLimits limits) {
-    if (const ErrorCode failed = CheckPolynomialOrder(n, order, fixedCount))
-        return failed;
+ErrorCode FitPolynomial(const FitSamples &samples, const FixedTerms &fixed, int32_t algorithm,
+                        RealVector c, const FitOutput &out, FitNorm norm, const FitLimits &limits) {
+    const int32_t n = samples.n();
+    QX_EXPECTS(CheckPolynomialOrder(n, static_cast<int32_t>(c.size()) - 1, fixed.count()) == 0);
     Terms terms;
-    if (const ErrorCode failed = terms.make(order, fixedOrders, fixedCount))
+    if (const ErrorCode failed = terms.make(static_cast<int32_t>(c.size()) - 1, fixed))
         return failed;
-    const PolynomialRows rows(terms, x, y, fixedValues);
-    if (const ErrorCode failed =
-            SolveFreeTerms({rows, n, terms.freeCount(), w}, algorithm, norm, limits, coefficients))
+    const PolynomialRows rows(terms, samples, fixed);
+    const LinearModel model = {rows, n, terms.freeCount(), samples.weights()};
+    if (const ErrorCode failed = SolveFreeTerms(model, algorithm, norm, limits, c.data()))
         return failed;
-    PlaceTerms(terms, order, fixedValues, coefficients);
-    if (mse != nullptr && n < 1)
+    PlaceTerms(terms, fixed, c);
+    if (out.mse != nullptr && n < 1)
         return ErrEmptyInput;
-    if (fit != nullptr)
-        Evaluate(x, y, w, n, coefficients, terms.last(), fit, mse);
+    if (!out.values.isEmpty())
+        Evaluate(samples, c.part(0, terms.last() + 1), out);
     return terms.isCapped() ? WarnPolynomialOrderCapped : 0;
 }
 

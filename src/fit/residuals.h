@@ -1,40 +1,57 @@
 #ifndef QX_FIT_RESIDUALS_H
 #define QX_FIT_RESIDUALS_H
 
+#include "fit/samples.h"
 #include "qx/errors.h"
-#include "qx/types.h"
-
-#include <cmath>
 
 namespace qx {
 
 // The sum of |w| (y - f)^2 over the samples, divided by their count and not by the sum of the
-// weights; w may be null. Always in the expanded form y^2 + (f - 2 y) f, term by term.
+// weights. Always in the expanded form y^2 + (f - 2 y) f, term by term.
 class SquaredResiduals {
 public:
-    explicit SquaredResiduals(const DBL *w) : w_(w) {}
-    void add(int32_t i, double y, double f) {
+    explicit SquaredResiduals(const FitSamples &samples) : samples_(samples) {}
+    void add(int32_t i, double f) {
+        const double y = samples_.y[i];
         const double term = y * y + (f - 2.0 * y) * f;
-        sum_ += w_ == nullptr ? term : term * std::fabs(w_[i]);
+        sum_ += samples_.w.isEmpty() ? term : term * std::fabs(samples_.w[i]);
     }
-    double mean(int32_t n) const { return sum_ / n; }
+    double mean() const { return sum_ / samples_.n(); }
 
 private:
-    const DBL *w_;
+    const FitSamples samples_;
     double sum_ = 0.0;
 };
 
-// ErrEmptyInput for n < 1.
-ErrorCode WeightedMSE(const DBL *y, const DBL *fit, const DBL *w, int32_t n, DBL *mse);
+// The values of a fit, of which valueAt(i) is that at sample i, and their MSE.
+template <class ValueAt>
+void EvaluateFit(const FitSamples &samples, const FitOutput &out, const ValueAt &valueAt) {
+    if (out.values.isEmpty() && out.mse == nullptr)
+        return;
+    SquaredResiduals squares(samples);
+    for (int32_t i = 0; i < samples.n(); ++i) {
+        const double f = valueAt(i);
+        squares.add(i, f);
+        if (!out.values.isEmpty())
+            out.values[i] = f;
+    }
+    if (out.mse != nullptr)
+        *out.mse = squares.mean();
+}
 
-// How well `fit` describes y: the weighted sum of squared residuals; 1 less its ratio to the
-// squares about the mean; and sqrt(sse / dof). The mean is the plain one, and the weights count
-// with their signs. dof of 0 or below becomes n - 2. Where all y are equal rSquare is 1 for a fit
-// without residuals, else infinite. Expanded sums, as above.
+struct FitScores {
+    double sse, rSquare, rmse;
+};
+
+// How well `fit` describes y, which has at least one element: the weighted sum of squared
+// residuals; 1 less its ratio to the squares about the mean; and sqrt(sse / dof). The mean is the
+// plain one, and the weights, where there are any, count with their signs. dof of 0 or below
+// becomes n - 2. Where all y are equal rSquare is 1 for a fit without residuals, else infinite.
+// Expanded sums, as above.
 //
 // ErrFewerThanTwo; ErrTooFewForParameters for n <= dof.
-ErrorCode GoodnessOfFit(const DBL *y, const DBL *fit, const DBL *w, int32_t n, int32_t dof,
-                        DBL *sse, DBL *rSquare, DBL *rmse);
+ErrorCode GoodnessOfFit(ConstRealVector y, ConstRealVector fit, ConstRealVector w, int32_t dof,
+                        FitScores *scores);
 
 } // namespace qx
 

@@ -2,76 +2,65 @@
 
 #include "fit/elimination.h"
 #include "fit/general.h"
-#include "frame/scratch.h"
 
 #include <cmath>
-#include <cstring>
+#include <utility>
 
 namespace qx {
 
 namespace {
 
-typedef Scratch<ElementType::DBL> Work;
-
-class Reweighting {
+class RobustFit {
 public:
-    Reweighting(const LinearModel &model, FitNorm norm) : model_(model), norm_(norm) {}
+    RobustFit(const LinearModel &model, FitNorm norm)
+        : model_(model), state_{norm, model.k, weightsOf(model)} {}
 
     ErrorCode allocate() {
-        const int64_t n = model_.n;
-        const int64_t k = model_.k;
-        if (const ErrorCode failed = memory_.allocate((norm_ == bisquare ? 4 : 3) * n))
+        const int32_t leverages = state_.norm == bisquare ? model_.k : 0;
+        if (const ErrorCode failed =
+                memory_.take(Sized(earlier_, model_.n), Sized(covariance_, leverages, leverages)))
             return failed;
-        return norm_ == bisquare ? covariance_.allocate(k * k) : 0;
+        return state_.take(model_.n);
     }
 
     // The least-squares solution, and for bisquare the leverages.
     ErrorCode start(DBL *c) {
-        DBL *const covariance = norm_ == bisquare ? covariance_.data() : nullptr;
+        const bool needsLeverages = state_.norm == bisquare;
+        DBL *const covariance = needsLeverages ? covariance_.data() : nullptr;
         if (const ErrorCode failed = SolveLinearModel(model_, bySVD, c, covariance))
             return failed;
-        if (norm_ == bisquare)
+        if (needsLeverages)
             if (const ErrorCode failed = findLeverages())
                 return failed;
         return findResiduals(c);
     }
 
     ErrorCode step(DBL *c) {
-        if (const ErrorCode failed = findWeights())
+        if (const ErrorCode failed = state_.findWeights())
             return failed;
-        const LinearModel reweighted = {model_.rows, model_.n, model_.k, weights()};
+        const LinearModel reweighted = {model_.rows, model_.n, model_.k, state_.weights.data()};
         if (const ErrorCode failed = SolveLinearModel(reweighted, bySVD, c, nullptr))
             return failed;
-        std::memcpy(earlier(), residuals(), static_cast<std::size_t>(model_.n) * sizeof(DBL));
+        std::swap(earlier_, state_.residuals);
         return findResiduals(c);
     }
 
     double size() const {
         double sum = 0.0;
-        for (int32_t i = 0; i < model_.n; ++i)
-            sum += std::fabs(residuals()[i]);
+        for (const double residual : state_.residuals)
+            sum += std::fabs(residual);
         return sum / model_.n;
     }
     double change() const {
         double sum = 0.0;
         for (int32_t i = 0; i < model_.n; ++i)
-            sum += std::fabs(residuals()[i] - earlier()[i]);
+            sum += std::fabs(state_.residuals[i] - earlier_[i]);
         return sum / model_.n;
     }
 
 private:
-    DBL *residuals() const { return memory_.data(); }
-    DBL *weights() const { return memory_.data() + model_.n; }
-    DBL *earlier() const { return weights() + model_.n; }
-    DBL *factors() const { return earlier() + model_.n; }
-
-    ErrorCode findWeights() {
-        if (norm_ == leastAbsolute)
-            return LeastAbsoluteWeights(residuals(), model_.w, model_.n, weights());
-        DBL *const adjusted = earlier(); // free until the step is done
-        for (int32_t i = 0; i < model_.n; ++i)
-            adjusted[i] = residuals()[i] * factors()[i];
-        return BisquareWeights(adjusted, model_.w, model_.n, model_.k, weights());
+    static ConstRealVector weightsOf(const LinearModel &model) {
+        return {model.w, model.w == nullptr ? 0 : model.n};
     }
 
     ErrorCode findResiduals(const DBL *c) {
@@ -80,7 +69,7 @@ private:
             return failed;
         RowBlock block;
         while (stream.next(&block)) {
-            DBL *const rest = residuals() + block.first;
+            const RealVector rest = state_.residuals.part(block.first, block.count);
             for (int32_t i = 0; i < block.count; ++i)
                 rest[i] = block.column(model_.k)[i];
             for (int32_t j = 0; j < model_.k; ++j)
@@ -92,7 +81,6 @@ private:
 
     // h = |w| times row C row^T with the covariance C.
     ErrorCode findLeverages() {
-        const int32_t k = model_.k;
         RowStream stream;
         if (const ErrorCode failed = stream.open(model_))
             return failed;
@@ -100,38 +88,38 @@ private:
         while (stream.next(&block))
             for (int32_t i = 0; i < block.count; ++i) {
                 double form = 0.0;
-                for (int32_t j = 0; j < k; ++j)
-                    for (int32_t l = 0; l < k; ++l)
-                        form += block.column(j)[i] * covariance_[std::ptrdiff_t{j} * k + l] *
-                                block.column(l)[i];
+                for (int32_t j = 0; j < model_.k; ++j)
+                    for (int32_t l = 0; l < model_.k; ++l)
+                        form += block.column(j)[i] * covariance_(j, l) * block.column(l)[i];
                 const std::ptrdiff_t at = block.first + i;
-                factors()[at] = model_.w == nullptr ? form : form * std::fabs(model_.w[at]);
+                state_.factors[at] = model_.w == nullptr ? form : form * std::fabs(model_.w[at]);
             }
-        LeverageFactors(factors(), model_.w, model_.n, factors());
+        state_.setLeverages();
         return 0;
     }
 
     const LinearModel &model_;
-    const FitNorm norm_;
-    Work memory_, covariance_;
+    Reweighting state_;
+    RealVector earlier_; // residuals of the step before
+    RealMatrix covariance_;
+    ScratchParts memory_;
 };
 
 } // namespace
 
-ErrorCode SolveRobustly(const LinearModel &model, FitNorm norm, RobustLimits limits, DBL *c) {
+ErrorCode SolveRobustly(const LinearModel &model, FitNorm norm, const FitLimits &given, DBL *c) {
     if (norm == leastSquares || model.k < 1 || model.n < model.k)
         return SolveLinearModel(model, bySVD, c, nullptr);
-    const double tolerance = limits.tolerance <= 0.0 ? 0.0001 : limits.tolerance;
-    const double floor = limits.floor <= 0.0 ? 1e-12 : limits.floor;
-    Reweighting fit(model, norm);
+    const FitLimits limits = given.settled();
+    RobustFit fit(model, norm);
     if (const ErrorCode failed = fit.allocate())
         return failed;
     if (const ErrorCode failed = fit.start(c))
         return failed;
-    for (int32_t i = 0; i < limits.iterations && fit.size() > floor; ++i) {
+    for (int32_t i = 0; i < limits.iterations && fit.size() > limits.floor; ++i) {
         if (const ErrorCode failed = fit.step(c))
             return failed;
-        if (fit.change() <= tolerance * fit.size())
+        if (fit.change() <= limits.tolerance * fit.size())
             break;
     }
     return 0;

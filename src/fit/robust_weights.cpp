@@ -9,63 +9,74 @@ namespace qx {
 
 namespace {
 
-double WeightOr1(const DBL *w, int32_t i) { return w == nullptr ? 1.0 : std::fabs(w[i]); }
+double WeightOr1(ConstRealVector w, std::ptrdiff_t i) {
+    return w.isEmpty() ? 1.0 : std::fabs(w[i]);
+}
+
+ErrorCode Median(ConstRealVector x, double *median) {
+    return ArrayMedian(x.data(), static_cast<int32_t>(x.size()), median);
+}
 
 // The distances of the adjusted residuals from their median, or from 0 where that is farther off
 // than any of them. *scale is their median, or their mean where that is 0.
-ErrorCode ScaleOfResiduals(const DBL *adjusted, int32_t n, DBL *distances, double *scale) {
+ErrorCode ScaleOfResiduals(ConstRealVector residuals, ConstRealVector factors, RealVector distances,
+                           double *scale) {
+    const std::ptrdiff_t n = distances.size();
+    for (std::ptrdiff_t i = 0; i < n; ++i)
+        distances[i] = residuals[i] * factors[i];
     double middle, largest = 0.0;
-    if (const ErrorCode failed = ArrayMedian(adjusted, n, &middle))
+    if (const ErrorCode failed = Median(distances, &middle))
         return failed;
-    for (int32_t i = 0; i < n; ++i) {
-        distances[i] = std::fabs(adjusted[i] - middle);
-        largest = distances[i] > largest ? distances[i] : largest;
+    for (DBL &distance : distances) {
+        distance = std::fabs(distance - middle);
+        largest = distance > largest ? distance : largest;
     }
-    for (int32_t i = 0; largest <= std::fabs(middle) && i < n; ++i)
-        distances[i] = std::fabs(adjusted[i]);
-    if (const ErrorCode failed = ArrayMedian(distances, n, scale))
+    for (std::ptrdiff_t i = 0; largest <= std::fabs(middle) && i < n; ++i)
+        distances[i] = std::fabs(residuals[i] * factors[i]);
+    if (const ErrorCode failed = Median(distances, scale))
         return failed;
-    return *scale == 0.0 ? ArrayMean(distances, n, scale) : 0;
+    return *scale == 0.0 ? ArrayMean(distances.data(), static_cast<int32_t>(n), scale) : 0;
 }
 
 } // namespace
 
-ErrorCode LeastAbsoluteWeights(const DBL *residuals, const DBL *w, int32_t n, DBL *out) {
-    for (int32_t i = 0; i < n; ++i)
+ErrorCode LeastAbsoluteWeights(ConstRealVector residuals, ConstRealVector w, RealVector out) {
+    for (std::ptrdiff_t i = 0; i < out.size(); ++i)
         out[i] = std::fabs(residuals[i]);
     double middle;
-    if (const ErrorCode failed = ArrayMedian(out, n, &middle))
+    if (const ErrorCode failed = Median(out, &middle))
         return failed;
     const double least = middle == 0.0 ? 1e-07 : 0.01 * middle;
-    for (int32_t i = 0; i < n; ++i)
+    for (std::ptrdiff_t i = 0; i < out.size(); ++i)
         out[i] = WeightOr1(w, i) / (out[i] > least ? out[i] : least);
     return 0;
 }
 
-void LeverageFactors(const DBL *leverage, const DBL *w, int32_t n, DBL *factors) {
-    for (int32_t i = 0; i < n; ++i) {
+void LeverageFactors(ConstRealVector leverage, ConstRealVector w, RealVector factors) {
+    for (std::ptrdiff_t i = 0; i < factors.size(); ++i) {
         const double h = leverage[i];
         // kept: beyond the limit two constants, which differ in their last digits
         const double rest = h <= 0.9999 ? 1.0 - h : 9.999999999998899e-05;
-        const double v = w != nullptr || h <= 0.9999 ? WeightOr1(w, i) / rest : 10000.0000000011;
+        const double v = !w.isEmpty() || h <= 0.9999 ? WeightOr1(w, i) / rest : 10000.0000000011;
         factors[i] = std::sqrt(std::fabs(v));
     }
 }
 
-ErrorCode BisquareWeights(DBL *adjusted, const DBL *w, int32_t n, int32_t parameters, DBL *out) {
+ErrorCode BisquareWeights(ConstRealVector residuals, ConstRealVector factors, ConstRealVector w,
+                          int32_t parameters, RealVector out) {
     double scale;
-    if (const ErrorCode failed = ScaleOfResiduals(adjusted, n, out, &scale))
+    if (const ErrorCode failed = ScaleOfResiduals(residuals, factors, out, &scale))
         return failed;
     const double factor = 0.6745 / (4.685 * scale);
     int32_t left = 0;
-    for (int32_t i = 0; i < n; ++i) {
-        const double q = adjusted[i] * factor;
+    for (std::ptrdiff_t i = 0; i < out.size(); ++i) {
+        const double q = residuals[i] * factors[i] * factor;
         const double weight = std::fabs(q) < 1.0 ? (1.0 - q * q) * (1.0 - q * q) : 0.0;
         left += weight != 0.0;
         out[i] = weight;
     }
     const bool areUsable = scale != 0.0 && left >= parameters;
-    for (int32_t i = 0; i < n; ++i)
+    for (std::ptrdiff_t i = 0; i < out.size(); ++i)
         out[i] = areUsable ? out[i] * WeightOr1(w, i) : WeightOr1(w, i);
     return 0;
 }

@@ -1,8 +1,7 @@
 #ifndef QX_FIT_ROBUST_WEIGHTS_H
 #define QX_FIT_ROBUST_WEIGHTS_H
 
-#include "qx/errors.h"
-#include "qx/types.h"
+#include "frame/scratch.h"
 
 namespace qx {
 
@@ -11,23 +10,46 @@ enum FitNorm : int32_t { leastSquares = 0, leastAbsolute = 1, bisquare = 2 };
 
 // The weights with which a least-squares step lowers the sum of |w| |residual|: |w| / |residual|,
 // where no residual counts as smaller than a hundredth of the median of all (E. J. Schlossmacher,
-// "An iterative technique for absolute deviations curve fitting", 1973). w may be null.
+// "An iterative technique for absolute deviations curve fitting", 1973). w may be empty.
 //
 // ErrNaNInData (a residual is NaN), ErrOutOfMemory.
-ErrorCode LeastAbsoluteWeights(const DBL *residuals, const DBL *w, int32_t n, DBL *out);
+ErrorCode LeastAbsoluteWeights(ConstRealVector residuals, ConstRealVector w, RealVector out);
 
 // sqrt(|w| / (1 - h)), by which a residual of leverage h is made comparable to the others; h counts
 // as no more than 0.9999. leverage may be factors.
-void LeverageFactors(const DBL *leverage, const DBL *w, int32_t n, DBL *factors);
+void LeverageFactors(ConstRealVector leverage, ConstRealVector w, RealVector factors);
 
 // Tukey's biweights times |w|, from residuals times their factors (A. E. Beaton, J. W. Tukey, "The
 // fitting of power series, meaning polynomials, illustrated on band-spectroscopic data", 1974; the
 // scale and 4.685 as in P. W. Holland, R. E. Welsch, "Robust regression using iteratively
 // reweighted least-squares", 1977). Where the residuals have no scale, or fewer than `parameters`
-// samples would be left, the weights stay |w|, or 1 without w. `adjusted` is spoiled.
+// samples would be left, the weights stay |w|, or 1 without w.
 //
 // ErrNaNInData, ErrOutOfMemory.
-ErrorCode BisquareWeights(DBL *adjusted, const DBL *w, int32_t n, int32_t parameters, DBL *out);
+ErrorCode BisquareWeights(ConstRealVector residuals, ConstRealVector factors, ConstRealVector w,
+                          int32_t parameters, RealVector out);
+
+// What a fit in a robust norm goes by from step to step: its residuals, and the weights of the next
+// step of least squares that follow from them. The fit writes residuals and, for bisquare,
+// leverages.
+struct Reweighting {
+    FitNorm norm;
+    int32_t parameters;
+    ConstRealVector w; // those of the caller, or empty
+    RealVector residuals = {}, weights = {}, factors = {};
+    ScratchParts memory = {};
+
+    ErrorCode take(int32_t n) {
+        return memory.take(Sized(residuals, n), Sized(weights, n),
+                           Sized(factors, norm == bisquare ? n : 0));
+    }
+    void setLeverages() { LeverageFactors(factors, w, factors); } // which are in `factors`
+    // ErrNaNInData, ErrOutOfMemory.
+    ErrorCode findWeights() const {
+        return norm == bisquare ? BisquareWeights(residuals, factors, w, parameters, weights)
+                                : LeastAbsoluteWeights(residuals, w, weights);
+    }
+};
 
 } // namespace qx
 

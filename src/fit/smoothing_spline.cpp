@@ -91,13 +91,14 @@ double LastNotAbove(const Function &f, double low, double atLow, double high, do
 
 } // namespace
 
-ErrorCode SmoothingSpline::make(const DBL *x, const DBL *y, const DBL *d, int32_t n) {
+ErrorCode SmoothingSpline::make(ConstRealVector x, ConstRealVector y, ConstRealVector d) {
+    const auto n = static_cast<int32_t>(x.size());
     x_ = x;
     y_ = y;
     d_ = d;
     n_ = n;
     unitOfX_ = (x[n - 1] - x[0]) / (n - 1);
-    unitOfD_ = d == nullptr ? 1.0 : LargestWeight(d, n);
+    unitOfD_ = d.isEmpty() ? 1.0 : LargestWeight(d.data(), n);
     if (const ErrorCode failed = memory_.take(Sized(rest_, n), Sized(steps_, int64_t{n} - 1)))
         return failed;
     takeOffLine();
@@ -209,8 +210,8 @@ void SmoothingSpline::Covariance::stepBack(double h, const Step &step) {
 }
 
 // second: in units of the mean spacing, 0 at both ends.
-SmoothingSpline::Quality SmoothingSpline::backwards(const Triangle &last, DBL *values,
-                                                    DBL *second) const {
+SmoothingSpline::Quality SmoothingSpline::backwards(const Triangle &last, RealVector values,
+                                                    RealVector second) const {
     double s = last.z2 / last.r22, g = (last.z1 - last.r12 * s) / last.r11;
     Covariance variance(last);
     Quality quality = {0.0, 0.0};
@@ -236,21 +237,22 @@ SmoothingSpline::Quality SmoothingSpline::backwards(const Triangle &last, DBL *v
     return quality;
 }
 
-SmoothingSpline::Quality SmoothingSpline::solve(double lambda, DBL *values, DBL *second) {
+SmoothingSpline::Quality SmoothingSpline::solve(double lambda, RealVector values,
+                                                RealVector second) {
     return backwards(forwards(lambda), values, second);
 }
 
 // The score of generalised cross validation (P. Craven, G. Wahba, Smoothing noisy data with spline
 // functions, 1979), less a factor of n.
-double SmoothingSpline::score(double logLambda, DBL *values, DBL *second) {
+double SmoothingSpline::score(double logLambda, RealVector values, RealVector second) {
     const Quality found = solve(std::exp(logLambda), values, second);
     const double rest = n_ - found.effective;
     return found.squares / (rest * rest);
 }
 
 // The spline through the samples: R s'' = Q' y, tridiagonal, by elimination.
-void SmoothingSpline::interpolate(DBL *second) {
-    DBL *const above = rest_;
+void SmoothingSpline::interpolate(RealVector second) {
+    const RealVector above = rest_;
     double before = 0.0, slope = (y_[1] - y_[0]) / spacing(0);
     above[0] = second[0] = 0.0;
     for (int32_t i = 1; i < n_ - 1; ++i) {
@@ -269,8 +271,8 @@ void SmoothingSpline::interpolate(DBL *second) {
 // Moves *at, whose score is `least`, to the lowest score between low and high, to 1e-5, and returns
 // that: parabolas, and the golden section where these do not converge (R. P. Brent, Algorithms for
 // Minimization Without Derivatives, 1973).
-double SmoothingSpline::leastScore(double low, double high, DBL *values, DBL *second, double *at,
-                                   double least) {
+double SmoothingSpline::leastScore(double low, double high, RealVector values, RealVector second,
+                                   double *at, double least) {
     constexpr double golden = 0x1.8722191a02d61p-2, tolerance = 2.5e-6;
     double best = *at, next = best, old = best; // the lowest three scores so far
     double atBest = least, atNext = least, atOld = least;
@@ -314,7 +316,7 @@ double SmoothingSpline::leastScore(double low, double high, DBL *values, DBL *se
 
 // A walk by factors of 10 from where the spline follows each sample to where it is nearly the line,
 // then the minimum about the lowest score; infinite where no score is below the line's.
-double SmoothingSpline::crossValidated(DBL *values, DBL *second) {
+double SmoothingSpline::crossValidated(RealVector values, RealVector second) {
     constexpr double decade = 0x1.26bb1bbb55516p+1;
     const auto decades = static_cast<int32_t>(4.0 * std::log10(n_)) + 2;
     double least = kInfinity, at = 0.0;
@@ -333,7 +335,7 @@ double SmoothingSpline::crossValidated(DBL *values, DBL *second) {
 
 // The largest lambda at which the squares are at most `wanted`, to 1e-13 of its logarithm or of 1;
 // 0 where that is beyond the numbers.
-double SmoothingSpline::within(double wanted, DBL *values, DBL *second) {
+double SmoothingSpline::within(double wanted, RealVector values, RealVector second) {
     if (wanted >= lineSquares_)
         return kInfinity;
     const auto excess = [&](double logLambda) {
@@ -362,8 +364,8 @@ double SmoothingSpline::within(double wanted, DBL *values, DBL *second) {
     return std::exp(LastNotAbove(excess, low, atLow, high, atHigh));
 }
 
-void SmoothingSpline::fit(Smoothing method, double parameter, DBL *values, DBL *second, DBL *lambda,
-                          DBL *effective) {
+void SmoothingSpline::fit(Smoothing method, double parameter, RealVector values, RealVector second,
+                          DBL *lambda, DBL *effective) {
     const double unit = unitOfD_ * unitOfD_ / (unitOfX_ * unitOfX_ * unitOfX_);
     double inside = parameter * unit;
     if (method == Smoothing::CrossValidated)
@@ -372,9 +374,10 @@ void SmoothingSpline::fit(Smoothing method, double parameter, DBL *values, DBL *
         inside = parameter == 0.0 ? 0.0 : within(parameter * unitOfD_ * unitOfD_, values, second);
     *lambda = method == Smoothing::Given ? parameter : inside / unit;
     if (inside == kInfinity) {
-        Fill(second, n_, 0.0);
-        for (int32_t i = 0; i < n_; ++i)
+        for (int32_t i = 0; i < n_; ++i) {
+            second[i] = 0.0;
             values[i] = onLine(i);
+        }
         *lambda = kInfinity;
         *effective = 2.0;
         return;

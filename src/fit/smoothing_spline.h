@@ -21,10 +21,10 @@ enum class Smoothing : int32_t { CrossValidated = 0, Given = 1, WithinSquares = 
 // and the weighted line is taken off y, which changes neither.
 class SmoothingSpline {
 public:
-    // d may be null. The arrays must outlive this. ErrOutOfMemory.
-    ErrorCode make(const DBL *x, const DBL *y, const DBL *d, int32_t n);
+    // d may be empty. The arrays must outlive this. ErrOutOfMemory.
+    ErrorCode make(ConstRealVector x, ConstRealVector y, ConstRealVector d);
     // values and second, n elements each, are also work until the end.
-    void fit(Smoothing method, double parameter, DBL *values, DBL *second, DBL *lambda,
+    void fit(Smoothing method, double parameter, RealVector values, RealVector second, DBL *lambda,
              DBL *effective);
 
 private:
@@ -37,25 +37,26 @@ private:
     struct Covariance;
 
     double spacing(int32_t i) const { return (x_[i + 1] - x_[i]) / unitOfX_; }
-    double deviation(int32_t i) const { return d_ == nullptr ? 1.0 : d_[i] / unitOfD_; }
+    double deviation(int32_t i) const { return d_.isEmpty() ? 1.0 : d_[i] / unitOfD_; }
     double onLine(int32_t i) const {
         return meanY_ + slope_ * ((x_[i] - x_[0]) / unitOfX_ - meanX_);
     }
     void takeOffLine();
     Triangle forwards(double lambda);
-    Quality backwards(const Triangle &last, DBL *values, DBL *second) const;
-    Quality solve(double lambda, DBL *values, DBL *second);
-    double score(double logLambda, DBL *values, DBL *second);
-    void interpolate(DBL *second);
-    double crossValidated(DBL *values, DBL *second);
-    double leastScore(double low, double high, DBL *values, DBL *second, double *at, double least);
-    double within(double squares, DBL *values, DBL *second);
+    Quality backwards(const Triangle &last, RealVector values, RealVector second) const;
+    Quality solve(double lambda, RealVector values, RealVector second);
+    double score(double logLambda, RealVector values, RealVector second);
+    void interpolate(RealVector second);
+    double crossValidated(RealVector values, RealVector second);
+    double leastScore(double low, double high, RealVector values, RealVector second, double *at,
+                      double least);
+    double within(double squares, RealVector values, RealVector second);
 
-    const DBL *x_ = nullptr, *y_ = nullptr, *d_ = nullptr;
+    ConstRealVector x_, y_, d_;
     int32_t n_ = 0;
     double unitOfX_ = 1.0, unitOfD_ = 1.0;
     double meanX_ = 0.0, meanY_ = 0.0, slope_ = 0.0, lineSquares_ = 0.0;
-    DBL *rest_ = nullptr; // y less the line
+    RealVector rest_; // y less the line
     Step *steps_ = nullptr;
     ScratchParts memory_;
 };

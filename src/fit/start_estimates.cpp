@@ -1,8 +1,8 @@
 #include "fit/start_estimates.h"
 
+#include "fit/exponential_power.h"
 #include "fit/gaussian.h"
 #include "fit/general.h"
-#include "fit/growth.h"
 #include "fit/polynomial.h"
 #include "frame/constants.h"
 #include "frame/scratch.h"
@@ -15,12 +15,9 @@ namespace qx {
 
 namespace {
 
-typedef Scratch<ElementType::DBL> Work;
-
 ErrorCode OffsetOfParabola(const FitSamples &samples, double *offset) {
     DBL c[3];
-    const ErrorCode status = FitPolynomial(samples.x, samples.y, samples.w, samples.n, 2, bySVD,
-                                           nullptr, nullptr, 0, nullptr, c, nullptr);
+    const ErrorCode status = FitPolynomial(samples, {}, bySVD, {c, 3}, {});
     if (status < 0)
         return status;
     const bool bends = std::isfinite(c[2]) && std::fabs(c[2]) > kEpsilon;
@@ -28,8 +25,8 @@ ErrorCode OffsetOfParabola(const FitSamples &samples, double *offset) {
     return 0;
 }
 
-void Lower(const DBL *y, int32_t n, double by, DBL *out) {
-    for (int32_t i = 0; i < n; ++i)
+void Lower(ConstRealVector y, double by, RealVector out) {
+    for (std::ptrdiff_t i = 0; i < y.size(); ++i)
         out[i] = y[i] - by;
 }
 
@@ -46,7 +43,7 @@ ErrorCode FindLevels(const FitSamples &samples, Levels *found) {
     DBL max, min;
     int32_t maxIndex, minIndex;
     if (const ErrorCode failed =
-            ArrayMaxMin(samples.y, samples.n, &max, &maxIndex, &min, &minIndex))
+            ArrayMaxMin(samples.y.data(), samples.n(), &max, &maxIndex, &min, &minIndex))
         return failed;
     if (maxIndex < 0) // all are NaN
         return ErrNoUsableFit;
@@ -56,7 +53,8 @@ ErrorCode FindLevels(const FitSamples &samples, Levels *found) {
     found->min = min;
     found->atMax = samples.x[maxIndex];
     found->atMin = samples.x[minIndex];
-    return ArrayHistogram(samples.y, samples.n, min, max, found->counts, found->centres, levels);
+    return ArrayHistogram(samples.y.data(), samples.n(), min, max, found->counts, found->centres,
+                          levels);
 }
 
 // The outermost level, from below or from above, at which more than a tenth of the samples stay.
@@ -72,8 +70,8 @@ int32_t BaseLevel(const Levels &found, int32_t n, bool fromBelow) {
 // Half the longer distance from the extreme to where the data are back at their level.
 double Deviation(const FitSamples &samples, double extremeAt, double level, double halfWidth) {
     double left = std::fabs(samples.x[0] - extremeAt);
-    double right = std::fabs(samples.x[samples.n - 1] - extremeAt);
-    for (int32_t i = 0; i < samples.n; ++i) {
+    double right = std::fabs(samples.x[samples.n() - 1] - extremeAt);
+    for (int32_t i = 0; i < samples.n(); ++i) {
         if (!(samples.y[i] > level - halfWidth && samples.y[i] < level + halfWidth))
             continue;
         const double distance = std::fabs(samples.x[i] - extremeAt);
@@ -90,16 +88,16 @@ struct Candidate {
     DBL p[4];
     DBL mse = -1.0;
 
-    ErrorCode fit(const FitSamples &samples, const Levels &found, bool isPeak, DBL *y) {
-        const double level = found.centres[BaseLevel(found, samples.n, isPeak)];
+    ErrorCode fit(const FitSamples &samples, const Levels &found, bool isPeak, RealVector y) {
+        const double level = found.centres[BaseLevel(found, samples.n(), isPeak)];
         const double extremeAt = isPeak ? found.atMax : found.atMin;
         const DBL guess[3] = {(isPeak ? found.max : found.min) - level, extremeAt,
                               Deviation(samples, extremeAt, level, found.halfWidth)};
-        Lower(samples.y, samples.n, level, y);
+        Lower(samples.y, level, y);
         int32_t steps;
         const FitLimits limits = {0.0001, 0.0001, 20};
-        const ErrorCode status = FitGaussian(samples.x, y, samples.w, samples.n, nullptr, &p[0],
-                                             &p[1], &p[2], &mse, guess, limits, &steps);
+        const ErrorCode status =
+            FitGaussian({{samples.x, y, samples.w}, guess, limits, p, &steps, {{}, &mse}});
         p[3] = level;
         if (status == ErrOutOfMemory)
             return status;
@@ -115,44 +113,45 @@ class Counting {
 public:
     ErrorCode take(const FitSamples &samples) {
         samples_ = samples;
-        if (samples.w == nullptr)
+        if (samples.w.isEmpty())
             return 0;
-        const int64_t n = samples.n;
-        if (const ErrorCode failed = memory_.allocate(3 * n))
+        RealVector x, y, w;
+        const int32_t n = samples.n();
+        if (const ErrorCode failed = memory_.take(Sized(x, n), Sized(y, n), Sized(w, n)))
             return failed;
-        DBL *const x = memory_.data(), *const y = x + n, *const w = y + n;
         int32_t count = 0;
-        for (int32_t i = 0; i < samples.n; ++i) {
+        for (int32_t i = 0; i < samples.n(); ++i) {
             if (samples.w[i] == 0.0)
                 continue;
             x[count] = samples.x[i];
             y[count] = samples.y[i];
             w[count++] = samples.w[i];
         }
-        samples_ = {x, y, w, count};
+        samples_ = {x.part(0, count), y.part(0, count), w.part(0, count)};
         return 0;
     }
     const FitSamples &samples() const { return samples_; }
 
 private:
     FitSamples samples_ = {};
-    Work memory_;
+    ScratchParts memory_;
 };
 
 } // namespace
 
 ErrorCode StartExponential(const FitSamples &samples, DBL *p) {
-    Work above;
-    if (const ErrorCode failed = above.allocate(samples.n))
+    Scratch<ElementType::DBL> memory;
+    if (const ErrorCode failed = memory.allocate(samples.n()))
         return failed;
+    const RealVector above(memory.data(), samples.n());
     double offset;
     if (const ErrorCode failed = OffsetOfParabola(samples, &offset))
         return failed;
-    Lower(samples.y, samples.n, offset, above.data());
+    Lower(samples.y, offset, above);
     int32_t steps;
     const ErrorCode status =
-        FitExponential(samples.x, above.data(), samples.w, samples.n, nullptr, &p[0], &p[1],
-                       nullptr, 0, nullptr, {0.0001, 1e-12, 50}, &steps);
+        FitExponential({{samples.x, above, samples.w}, nullptr, {}, p, &steps, {}},
+                       ExponentialMethod::LogarithmicLine);
     p[2] = offset;
     return status < 0 ? status : 0;
 }
@@ -162,16 +161,17 @@ ErrorCode StartGaussian(const FitSamples &samples, DBL *p) {
     if (const ErrorCode failed = counting.take(samples))
         return failed;
     const FitSamples &used = counting.samples();
-    Work above;
-    if (const ErrorCode failed = above.allocate(used.n))
+    Scratch<ElementType::DBL> memory;
+    if (const ErrorCode failed = memory.allocate(used.n()))
         return failed;
+    const RealVector above(memory.data(), used.n());
     Levels found;
     if (const ErrorCode failed = FindLevels(used, &found))
         return failed;
     Candidate peak, dip;
-    if (const ErrorCode failed = peak.fit(used, found, true, above.data()))
+    if (const ErrorCode failed = peak.fit(used, found, true, above))
         return failed;
-    if (const ErrorCode failed = dip.fit(used, found, false, above.data()))
+    if (const ErrorCode failed = dip.fit(used, found, false, above))
         return failed;
     if (peak.mse < 0.0 && dip.mse < 0.0)
         return ErrNoUsableFit;

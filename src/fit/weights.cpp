@@ -1,26 +1,34 @@
 #include "fit/weights.h"
 
+#include "linalg/matrix.h"
+
 namespace qx {
 
-ErrorCode SettleWeights(int32_t n, int32_t fewest, const DBL **settled) {
-    const DBL *const w = *settled;
+ErrorCode SettleWeights(FitSamples *samples, int32_t fewest) {
+    const int32_t n = samples->n();
     if (n < fewest)
         return fewest == 2 ? ErrFewerThanTwo : ErrFewerThanThree;
-    if (w == nullptr)
+    if (samples->w.isEmpty())
         return 0;
     WeightCounts counts;
-    CountWeights(w, n, &counts);
+    CountWeights(samples->w.data(), n, &counts);
     if (counts.broken != 0.0)
         return ErrNonFiniteInput;
     if (counts.used == 0.0)
-        *settled = nullptr;
+        samples->w = {};
     else if (counts.used < fewest)
         return ErrTooFewWeights;
     return 0;
 }
 
-void WeightsOfDeviations(const DBL *deviations, int32_t n, DBL *w) {
-    for (int32_t i = 0; i < n; ++i) {
+ErrorCode SettleFiniteWeights(FitSamples *samples, int32_t fewest) {
+    if (!samples->w.isEmpty() && CheckFinite(samples->w.data(), samples->n()) != 0)
+        return ErrNonFiniteInput;
+    return SettleWeights(samples, fewest);
+}
+
+void WeightsOfDeviations(ConstRealVector deviations, RealVector w) {
+    for (std::ptrdiff_t i = 0; i < w.size(); ++i) {
         const double deviation = deviations[i];
         w[i] = deviation == 0.0 ? 1.0 : 1.0 / (deviation * deviation);
     }

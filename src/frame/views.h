@@ -47,8 +47,20 @@ public:
     std::ptrdiff_t size() const { return size_; }
     bool isEmpty() const { return size_ == 0; }
     T &operator[](std::ptrdiff_t i) const { return data_[i]; }
-    T *begin() const { return data_; }
-    T *end() const { return data_ + size_; }
+
+    // For loops over the elements. A class, for `auto` and template arguments would drop the
+    // alignment from a pointer.
+    struct Iterator {
+        T *at;
+        T &operator*() const { return *at; }
+        Iterator &operator++() {
+            ++at;
+            return *this;
+        }
+        bool operator==(const Iterator &) const = default;
+    };
+    Iterator begin() const { return {data_}; }
+    Iterator end() const { return {data_ + size_}; }
 
     // `count` elements from element `first` on.
     BasicVectorView part(std::ptrdiff_t first, std::ptrdiff_t count) const {

@@ -1,11 +1,10 @@
 #include "qx/bounded_fits.h"
 
 #include "fit/bounded_fits.h"
+#include "fit/exports/fit_arguments.h"
 #include "frame/constants.h"
-#include "frame/export.h"
 
 #include <cmath>
-#include <cstring>
 
 namespace qx {
 namespace {
@@ -32,7 +31,7 @@ public:
         }
         return 0;
     }
-    FitBounds bounds() const { return {lower_, upper_}; }
+    FitBounds bounds() const { return {{lower_, Count}, {upper_, Count}}; }
 
 private:
     static bool IsShort(In<DBL1D> array) { return array.size() > 0 && array.size() < Count; }
@@ -48,41 +47,49 @@ const DBL *GuessFrom(In<DBL1D> guess, ErrorCode *warning) {
     return nullptr;
 }
 
-ErrorCode CheckLengths(InOut<DBL1D> y, In<DBL1D> x, In<DBL1D> w) {
-    const bool fits = x.size() == y.size() && (w.isEmpty() || w.size() == y.size());
-    return fits ? 0 : ErrSizeMismatch;
-}
-
-FitSamples Samples(InOut<DBL1D> y, In<DBL1D> x, In<DBL1D> w) {
-    return {x.data(), y.data(), w.isEmpty() ? nullptr : w.data(), y.size()};
-}
-
-// A limit that is reached leaves the results where they are; a warning counts where all else is
-// well.
-Outcome Told(ErrorCode status, ErrorCode warning) {
-    if (status == ErrIterationLimit)
-        return Outcome::WithResults(status);
+// The frame of all: sizes, bounds, the fit, and the parameters where they belong. `request` has
+// the rest; a warning counts where all else is well.
+template <std::size_t Count, class Fit>
+ErrorCode FitBounded(InOut<DBL1D> y, In<DBL1D> x, In<DBL1D> w, In<DBL1D> lower, In<DBL1D> upper,
+                     BadBounds rule, BoundedFit request, OutDBL (&parameters)[Count],
+                     ErrorCode warning, const Fit &fit) {
+    if (!SizesFit(y, x, w))
+        return ErrSizeMismatch;
+    BoundsOf<Count> bounds;
+    if (const ErrorCode bad = bounds.take(lower, upper, rule, &warning))
+        return bad;
+    DBL p[Count] = {};
+    request.samples = SamplesOf(y, x, w);
+    request.bounds = bounds.bounds();
+    request.p = p;
+    request.values = y.view();
+    const ErrorCode status = fit(request);
+    for (std::size_t i = 0; i < Count; ++i)
+        parameters[i] = p[i];
     return status == 0 ? warning : status;
+}
+
+// What a request takes from the arguments as they are.
+BoundedFit RequestOf(const DBL *guess, uint16_t method, double tolerance, OutI32 iterations,
+                     OutDBL mse) {
+    return {.guess = guess,
+            .method = method,
+            .tolerance = tolerance,
+            .iterations = iterations.address(),
+            .mse = mse.address()};
 }
 
 template <FitNorm Norm>
 Outcome BoundedLine(InOut<DBL1D> y, In<DBL1D> x, In<DBL1D> w, double tolerance, OutI32 iterations,
                     In<DBL1D> lower, In<DBL1D> upper, OutDBL a, OutDBL b, OutDBL mse) {
-    if (const ErrorCode bad = CheckLengths(y, x, w))
-        return bad;
-    ErrorCode warning = 0;
-    BoundsOf<2> bounds;
     // kept: the robust exports go on with bounds of bad length
     constexpr BadBounds rule = Norm == leastSquares ? BadBounds::Fail : BadBounds::Warn;
-    if (const ErrorCode bad = bounds.take(lower, upper, rule, &warning))
-        return bad;
-    DBL p[2] = {};
+    OutDBL p[] = {a, b};
     const ErrorCode status =
-        FitBoundedLine({Samples(y, x, w), nullptr, bounds.bounds(), Norm, tolerance,
-                        iterations.address(), p, y.data(), mse.address()});
-    a = p[0];
-    b = p[1];
-    return Told(status, warning);
+        FitBounded(y, x, w, lower, upper, rule,
+                   RequestOf(nullptr, Norm, tolerance, iterations, mse), p, 0, FitBoundedLine);
+    // A limit that is reached leaves the results where they are.
+    return status == ErrIterationLimit ? Outcome::WithResults(status) : status;
 }
 
 Outcome PlainBoundedLine(InOut<DBL1D> y, In<DBL1D> x, In<DBL1D> w, In<DBL1D> lower, In<DBL1D> upper,
@@ -95,64 +102,36 @@ template <ErrorCode (*Fit)(const BoundedFit &)>
 Outcome BoundedModel(InOut<DBL1D> y, In<DBL1D> x, In<DBL1D> w, double tolerance, OutI32 iterations,
                      In<DBL1D> guess, In<DBL1D> lower, In<DBL1D> upper, uint16_t method, OutDBL a,
                      OutDBL b, OutDBL c, OutDBL mse) {
-    if (const ErrorCode bad = CheckLengths(y, x, w))
-        return bad;
     ErrorCode warning = 0;
     const DBL *const start = GuessFrom<3>(guess, &warning);
-    BoundsOf<3> bounds;
-    if (const ErrorCode bad = bounds.take(lower, upper, BadBounds::Fail, &warning))
-        return bad;
-    DBL p[3] = {};
-    const ErrorCode status = Fit({Samples(y, x, w), start, bounds.bounds(), method, tolerance,
-                                  iterations.address(), p, y.data(), mse.address()});
-    a = p[0];
-    b = p[1];
-    c = p[2];
-    return status == 0 ? warning : status;
+    OutDBL p[] = {a, b, c};
+    return FitBounded(y, x, w, lower, upper, BadBounds::Fail,
+                      RequestOf(start, method, tolerance, iterations, mse), p, warning, Fit);
 }
 
 Outcome BoundedLog(InOut<DBL1D> y, In<DBL1D> x, In<DBL1D> w, double base, OutI32 iterations,
                    In<DBL1D> guess, In<DBL1D> lower, In<DBL1D> upper, uint16_t method,
                    double tolerance, OutDBL a, OutDBL b, OutDBL mse) {
-    if (const ErrorCode bad = CheckLengths(y, x, w))
-        return bad;
     ErrorCode warning = 0;
     GuessFrom<2>(guess, &warning); // kept: the fit has its own start
-    BoundsOf<2> bounds;
-    if (const ErrorCode bad = bounds.take(lower, upper, BadBounds::Fail, &warning))
-        return bad;
-    DBL p[2] = {};
-    const ErrorCode status =
-        FitBoundedLog({Samples(y, x, w), nullptr, bounds.bounds(), method, tolerance,
-                       iterations.address(), p, y.data(), mse.address()},
-                      base);
-    a = p[0];
-    b = p[1];
-    return status == 0 ? warning : status;
+    OutDBL p[] = {a, b};
+    return FitBounded(y, x, w, lower, upper, BadBounds::Fail,
+                      RequestOf(nullptr, method, tolerance, iterations, mse), p, warning,
+                      [=](const BoundedFit &request) { return FitBoundedLog(request, base); });
 }
 
 Outcome BoundedGaussian(InOut<DBL1D> y, In<DBL1D> x, In<DBL1D> w, double tolerance,
                         OutI32 iterations, In<DBL1D> guess, In<DBL1D> lower, In<DBL1D> upper,
                         uint16_t method, OutDBL a, OutDBL m, OutDBL s, OutDBL c, OutDBL mse) {
-    if (const ErrorCode bad = CheckLengths(y, x, w))
-        return bad;
     ErrorCode warning = 0;
     const DBL *start = GuessFrom<4>(guess, &warning);
     if (start != nullptr && !std::isfinite(start[0]))
         start = nullptr; // kept: only the first element is looked at
-    BoundsOf<4> bounds;
-    // kept: no test of the lengths
-    if (const ErrorCode bad = bounds.take(lower, upper, BadBounds::Pass, &warning))
-        return bad;
-    DBL p[4] = {};
-    const ErrorCode status =
-        FitBoundedGaussian({Samples(y, x, w), start, bounds.bounds(), method, tolerance,
-                            iterations.address(), p, y.data(), mse.address()});
-    a = p[0];
-    m = p[1];
-    s = p[2];
-    c = p[3];
-    return status == 0 ? warning : status;
+    OutDBL p[] = {a, m, s, c};
+    // kept: no test of the bounds' lengths
+    return FitBounded(y, x, w, lower, upper, BadBounds::Pass,
+                      RequestOf(start, method, tolerance, iterations, mse), p, warning,
+                      FitBoundedGaussian);
 }
 
 } // namespace

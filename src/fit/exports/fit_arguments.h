@@ -8,12 +8,20 @@
 
 namespace qx {
 
-// Weights are empty or as many as the samples.
+// Weights are empty or as many as the samples; some exports have no such argument.
 inline bool WeightsFit(In<DBL1D> w, int32_t n) { return w.isEmpty() || w.size() == n; }
-inline const DBL *WeightsOf(In<DBL1D> w) { return w.isEmpty() ? nullptr : w.data(); }
-// An export without the argument.
 inline bool WeightsFit(std::nullptr_t, int32_t) { return true; }
-inline const DBL *WeightsOf(std::nullptr_t) { return nullptr; }
+inline ConstRealVector WeightsOf(In<DBL1D> w) { return w.view(); }
+inline ConstRealVector WeightsOf(std::nullptr_t) { return {}; }
+
+template <class Y, class Weights>
+bool SizesFit(Y y, In<DBL1D> x, Weights w) {
+    return x.size() == y.size() && WeightsFit(w, y.size());
+}
+template <class Y, class Weights>
+FitSamples SamplesOf(Y y, In<DBL1D> x, Weights w) {
+    return {x.view(), y.view(), WeightsOf(w)};
+}
 
 // kept: the oldest exports take standard deviations in the place of weights
 enum class Given { Weights, Deviations };
@@ -23,19 +31,20 @@ class SampleWeights {
 public:
     ErrorCode make(std::nullptr_t, Given) { return 0; }
     ErrorCode make(In<DBL1D> argument, Given given) {
-        data_ = WeightsOf(argument);
-        if (data_ == nullptr || given == Given::Weights)
+        view_ = argument.view();
+        if (view_.isEmpty() || given == Given::Weights)
             return 0;
         if (const ErrorCode failed = memory_.allocate(argument.size()))
             return failed;
-        WeightsOfDeviations(data_, argument.size(), memory_.data());
-        data_ = memory_.data();
+        const RealVector weights(memory_.data(), argument.size());
+        WeightsOfDeviations(view_, weights);
+        view_ = weights;
         return 0;
     }
-    const DBL *data() const { return data_; } // null for none
+    ConstRealVector view() const { return view_; } // empty for none
 
 private:
-    const DBL *data_ = nullptr;
+    ConstRealVector view_;
     Scratch<ElementType::DBL> memory_;
 };
 
@@ -43,14 +52,12 @@ private:
 struct ValuesInPlace {
     typedef InOut<DBL1D> Y;
     typedef OutDBL MSE;
-    static DBL *fit(Y y) { return y.data(); }
-    static DBL *mse(MSE mse) { return mse.address(); }
+    static FitOutput output(Y y, MSE mse) { return {y.view(), mse.address()}; }
 };
 struct CoefficientsOnly {
     typedef In<DBL1D> Y;
     typedef std::nullptr_t MSE;
-    static DBL *fit(Y) { return nullptr; }
-    static DBL *mse(MSE) { return nullptr; }
+    static FitOutput output(Y, MSE) { return {}; }
 };
 
 // A guess of `count` values. A shorter one counts as none, and of a longer one the first count.

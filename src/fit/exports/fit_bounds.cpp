@@ -1,6 +1,6 @@
 #include "qx/fit_bounds.h"
 
-#include "fit/bounds.h"
+#include "fit/confidence_bounds.h"
 #include "fit/exports/fit_arguments.h"
 #include "fit/logarithm.h"
 #include "frame/constants.h"
@@ -40,7 +40,7 @@ struct Exponential {
 struct Power {
     static constexpr int32_t count = 2;
     static ErrorCode check(In<DBL1D> x, const DBL *) {
-        return SameSign(x.data(), x.size()) == 1.0 ? 0 : ErrNotStrictlyPositive;
+        return SameSign(x.view()) == 1.0 ? 0 : ErrNotStrictlyPositive;
     }
     static bool isSingular(const DBL *c) { return c[0] == 0.0; }
     static double evaluate(double x, const DBL *c, DBL *d) {
@@ -68,7 +68,7 @@ public:
     static constexpr int32_t count = 2;
     explicit Logarithm(double base) : base_(base), logarithm_(base) {}
     ErrorCode check(In<DBL1D> x, const DBL *c) const {
-        const double sign = SameSign(x.data(), x.size());
+        const double sign = SameSign(x.view());
         const bool isPositive = (sign > 0.0 && c[1] > 0.0) || (sign < 0.0 && c[1] < 0.0);
         return isPositive && base_ > 0.0 && base_ != 1.0 ? 0 : ErrNotStrictlyPositive;
     }
@@ -109,8 +109,8 @@ Outcome Bounds(const FittedModel &model, In<DBL1D>, double confidence,
                const PredictionOutputs &out) {
     if (const Outcome bad = Sized(out, model.linear.n, 0))
         return bad;
-    return BoundsOfFit(model, confidence, BoundsOf::Observation, nullptr, out.lower.data(),
-                       out.upper.data());
+    return BoundsOfFit(model, confidence, BoundsOf::Observation, {}, out.lower.view(),
+                       out.upper.view());
 }
 // Coefficients beyond the parameters of the model are given and have no width.
 Outcome Bounds(const FittedModel &model, In<DBL1D> coefficients, double confidence,
@@ -118,10 +118,10 @@ Outcome Bounds(const FittedModel &model, In<DBL1D> coefficients, double confiden
     const int32_t count = coefficients.size();
     if (const Outcome bad = Sized(out, model.linear.n, count))
         return bad;
-    DBL *const low = out.lowerCoefficients.data(), *const high = out.upperCoefficients.data();
-    Fill(high, count, 0.0);
+    const RealVector low = out.lowerCoefficients.view(), high = out.upperCoefficients.view();
+    Fill(high.data(), count, 0.0);
     if (const ErrorCode failed = BoundsOfFit(model, confidence, BoundsOf::Curve, high,
-                                             out.lower.data(), out.upper.data()))
+                                             out.lower.view(), out.upper.view()))
         return failed;
     for (int32_t i = 0; i < count; ++i) {
         const double c = coefficients.data()[i], half = high[i];
@@ -138,6 +138,14 @@ struct Samples {
                (w.isEmpty() || CheckFinite(w.data(), w.size()) == 0) &&
                CheckFinite(coefficients.data(), coefficients.size()) == 0;
     }
+    // The samples whose weight is not 0.
+    int32_t countUsed() const {
+        int32_t used = y.size();
+        for (const double weight : w.view())
+            used -= weight == 0.0;
+        return used;
+    }
+    const DBL *weights() const { return w.isEmpty() ? nullptr : w.data(); }
 };
 
 // The checks that all share, behind those of the model's own.
@@ -167,7 +175,7 @@ Outcome CurveBounds(const Model &curve, In<DBL1D> x, const Samples &samples, dou
     const DBL *const c = samples.coefficients.data();
     if (const ErrorCode failed = curve.check(x, c))
         return failed;
-    const int32_t n = x.size(), used = CountUsed(WeightsOf(samples.w), n);
+    const int32_t n = x.size(), used = samples.countUsed();
     if (const ErrorCode failed = CheckDegrees(used, k, confidence))
         return failed;
     if (curve.isSingular(c))
@@ -180,7 +188,7 @@ Outcome CurveBounds(const Model &curve, In<DBL1D> x, const Samples &samples, dou
                 block.column(j)[i] = d[j];
         }
     };
-    return Bounds({{writeRows, n, k, WeightsOf(samples.w)}, samples.y.data(), used},
+    return Bounds({{writeRows, n, k, samples.weights()}, samples.y.view(), used},
                   samples.coefficients, confidence, out);
 }
 
@@ -195,7 +203,7 @@ Outcome PolynomialBounds(In<DBL1D> x, const Samples &samples, double confidence,
         return ErrNonFiniteInput;
     const DBL *const c = samples.coefficients.data();
     const int32_t terms = samples.coefficients.size(), k = std::min(terms, mostFitted);
-    const int32_t n = x.size(), used = CountUsed(WeightsOf(samples.w), n);
+    const int32_t n = x.size(), used = samples.countUsed();
     if (const ErrorCode failed = CheckDegrees(used, k, confidence))
         return failed;
     const auto writeRows = [&](const RowBlock &block) {
@@ -210,7 +218,7 @@ Outcome PolynomialBounds(In<DBL1D> x, const Samples &samples, double confidence,
             for (int32_t i = 0; i < block.count; ++i)
                 block.column(j)[i] = block.column(j - 1)[i] * from[i];
     };
-    return Bounds({{writeRows, n, k, WeightsOf(samples.w)}, samples.y.data(), used},
+    return Bounds({{writeRows, n, k, samples.weights()}, samples.y.view(), used},
                   samples.coefficients, confidence, out);
 }
 
@@ -223,7 +231,7 @@ Outcome MatrixBounds(In<DBL2D> h, const Samples &samples, double confidence, con
         return ErrSizeMismatch;
     if (CheckFinite(h.data(), int64_t{n} * k) != 0 || !samples.areFinite())
         return ErrNonFiniteInput;
-    const int32_t used = CountUsed(WeightsOf(samples.w), n);
+    const int32_t used = samples.countUsed();
     if (const ErrorCode failed = CheckDegrees(used, k, confidence))
         return failed;
     const DBL *const c = samples.coefficients.data();
@@ -235,7 +243,7 @@ Outcome MatrixBounds(In<DBL2D> h, const Samples &samples, double confidence, con
             for (int32_t i = 0; i < block.count; ++i)
                 value[i] += block.column(j)[i] * c[j];
     };
-    return Bounds({{writeRows, n, k, WeightsOf(samples.w)}, samples.y.data(), used},
+    return Bounds({{writeRows, n, k, samples.weights()}, samples.y.view(), used},
                   samples.coefficients, confidence, out);
 }
 

@@ -8,9 +8,10 @@ namespace {
 
 template <ErrorCode (*Interpolate)(const Table &, double, double *, double *)>
 ErrorCode Interpolated(In<DBL1D> y, In<DBL1D> x, double xi, OutDBL yi, OutDBL dy) {
-    if (x.size() != y.size())
-        return ErrSizeMismatch;
-    return Interpolate({x.data(), y.data(), x.size()}, xi, yi.address(), dy.address());
+    if (const ErrorCode bad =
+            FirstFailed({{x.size() != y.size(), ErrSizeMismatch}, {x.isEmpty(), ErrEmptyInput}}))
+        return bad;
+    return Interpolate({x.view(), y.view()}, xi, yi.address(), dy.address());
 }
 
 Outcome Spline(In<DBL1D> y, In<DBL1D> x, double firstSlope, double lastSlope,
@@ -19,8 +20,10 @@ Outcome Spline(In<DBL1D> y, In<DBL1D> x, double firstSlope, double lastSlope,
         return ErrSizeMismatch;
     if (const Outcome bad = secondDerivatives.resize(x.size()))
         return bad;
-    return SplineSecondDerivatives({x.data(), y.data(), x.size()}, firstSlope, lastSlope,
-                                   secondDerivatives.data());
+    if (x.isEmpty())
+        return ErrEmptyInput;
+    return SplineSecondDerivatives({x.view(), y.view()}, firstSlope, lastSlope,
+                                   secondDerivatives.view());
 }
 
 // The one export that takes null handles.
@@ -32,8 +35,9 @@ ErrorCode SplineValue(DBL1D y, DBL1D x, DBL1D secondDerivatives, double xi, OutD
     const In<DBL1D> bends(secondDerivatives);
     if (points.size() != values.size() || points.size() != bends.size())
         return ErrSizeMismatch;
-    return InterpolateBySpline({points.data(), values.data(), points.size()}, bends.data(), xi,
-                               yi.address());
+    if (points.isEmpty())
+        return ErrEmptyInput;
+    return InterpolateBySpline({points.view(), values.view()}, bends.view(), xi, yi.address());
 }
 
 } // namespace

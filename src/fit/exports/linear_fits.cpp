@@ -13,20 +13,22 @@ namespace qx {
 namespace {
 
 template <class Gives, class Weights>
-Outcome Line(typename Gives::Y y, In<DBL1D> x, Weights w, OutDBL slope, OutDBL intercept,
-             typename Gives::MSE mse) {
-    if (x.size() != y.size() || !WeightsFit(w, y.size()))
+Outcome StraightLine(typename Gives::Y y, In<DBL1D> x, Weights w, OutDBL slope, OutDBL intercept,
+                     typename Gives::MSE mse) {
+    if (!SizesFit(y, x, w))
         return ErrSizeMismatch;
-    return FitLine(x.data(), y.data(), y.size(), WeightsOf(w), Gives::fit(y), slope.address(),
-                   intercept.address(), Gives::mse(mse));
+    Line line;
+    if (const ErrorCode failed = FitLine(SamplesOf(y, x, w), &line, Gives::output(y, mse)))
+        return failed;
+    slope = line.slope;
+    intercept = line.intercept;
+    return 0;
 }
 
 // What the revisions of the polynomial fit have added to its arguments.
 struct PolynomialTerms {
-    const DBL *w;
-    const I32 *fixedOrders;
-    const DBL *fixedValues;
-    int32_t fixedCount;
+    ConstRealVector w;
+    FixedTerms fixed;
 };
 
 Outcome FitTerms(In<DBL1D> x, In<DBL1D> y, int32_t order, int32_t algorithm,
@@ -35,7 +37,7 @@ Outcome FitTerms(In<DBL1D> x, In<DBL1D> y, int32_t order, int32_t algorithm,
     const int32_t n = x.size();
     if (y.size() != n)
         return ErrSizeMismatch;
-    if (const ErrorCode failed = CheckPolynomialOrder(n, order, terms.fixedCount))
+    if (const ErrorCode failed = CheckPolynomialOrder(n, order, terms.fixed.count()))
         return failed;
     if (order == std::numeric_limits<int32_t>::max())
         return ErrOutOfMemory;
@@ -43,9 +45,8 @@ Outcome FitTerms(In<DBL1D> x, In<DBL1D> y, int32_t order, int32_t algorithm,
         return bad;
     if (const Outcome bad = coefficients.resize(order + 1))
         return bad;
-    return FitPolynomial(x.data(), y.data(), terms.w, n, order, algorithm, terms.fixedOrders,
-                         terms.fixedValues, terms.fixedCount, fit.data(), coefficients.data(),
-                         mse.address());
+    return FitPolynomial({x.view(), y.view(), terms.w}, terms.fixed, algorithm, coefficients.view(),
+                         {fit.view(), mse.address()});
 }
 
 Outcome FitPoly(In<DBL1D> x, In<DBL1D> y, int32_t order, int32_t algorithm, Out<DBL1D> fit,
@@ -58,8 +59,7 @@ Outcome FitPolyWithFixed(In<DBL1D> x, In<DBL1D> y, int32_t order, int32_t algori
                          Out<DBL1D> coefficients, OutDBL mse) {
     if (fixedOrders.size() != fixedValues.size())
         return ErrSizeMismatch;
-    return FitTerms(x, y, order, algorithm,
-                    {nullptr, fixedOrders.data(), fixedValues.data(), fixedOrders.size()}, fit,
+    return FitTerms(x, y, order, algorithm, {{}, {fixedOrders.view(), fixedValues.view()}}, fit,
                     coefficients, mse);
 }
 
@@ -68,9 +68,8 @@ Outcome FitPolyWeighted(In<DBL1D> x, In<DBL1D> y, int32_t order, In<DBL1D> w, in
                         Out<DBL1D> coefficients, OutDBL mse) {
     if (!WeightsFit(w, x.size()) || fixedOrders.size() != fixedValues.size())
         return ErrSizeMismatch;
-    return FitTerms(x, y, order, algorithm,
-                    {WeightsOf(w), fixedOrders.data(), fixedValues.data(), fixedOrders.size()}, fit,
-                    coefficients, mse);
+    return FitTerms(x, y, order, algorithm, {w.view(), {fixedOrders.view(), fixedValues.view()}},
+                    fit, coefficients, mse);
 }
 
 template <Given given>
@@ -90,8 +89,8 @@ Outcome FitMatrix(In<DBL2D> h, In<DBL1D> y, In<DBL1D> w, int32_t algorithm, int3
     SampleWeights weights;
     if (const ErrorCode failed = weights.make(w, given))
         return failed;
-    return FitGeneral(h.data(), h.rows(), k, y.data(), weights.data(), coefficients.data(),
-                      fit.data(), mse.address(), side > 0 ? covariance.data() : nullptr, algorithm);
+    return FitGeneral(h.view(), {{}, y.view(), weights.view()}, algorithm, coefficients.view(),
+                      covariance.view(), {fit.view(), mse.address()});
 }
 
 Outcome ScoreFit(In<DBL1D> y, In<DBL1D> fit, In<DBL1D> w, int32_t dof, OutDBL sse, OutDBL rSquare,
@@ -100,8 +99,13 @@ Outcome ScoreFit(In<DBL1D> y, In<DBL1D> fit, In<DBL1D> w, int32_t dof, OutDBL ss
             FirstFailed({{y.isEmpty(), ErrEmptyInput},
                          {fit.size() != y.size() || !WeightsFit(w, y.size()), ErrSizeMismatch}}))
         return bad;
-    return GoodnessOfFit(y.data(), fit.data(), WeightsOf(w), y.size(), dof, sse.address(),
-                         rSquare.address(), rmse.address());
+    FitScores scores;
+    if (const ErrorCode failed = GoodnessOfFit(y.view(), fit.view(), w.view(), dof, &scores))
+        return failed;
+    sse = scores.sse;
+    rSquare = scores.rSquare;
+    rmse = scores.rmse;
+    return 0;
 }
 
 Outcome DampedStep(InOut<DBL1D> coefficients, In<DBL2D> a, In<DBL1D> gradient,
@@ -109,14 +113,14 @@ Outcome DampedStep(InOut<DBL1D> coefficients, In<DBL2D> a, In<DBL1D> gradient,
     const int32_t n = coefficients.size();
     if (n < 1 || a.rows() != n || a.cols() != n || gradient.size() != n)
         return ErrEmptyInput;
-    const int64_t square = int64_t{n} * n;
-    Scratch<ElementType::DBL> memory;
-    if (const ErrorCode failed = memory.allocate(square + n))
+    RealMatrix matrix;
+    RealVector g;
+    ScratchParts memory;
+    if (const ErrorCode failed = memory.take(Sized(matrix, n, n), Sized(g, n)))
         return failed;
-    DBL *const g = memory.data() + square;
-    std::memcpy(memory.data(), a.data(), static_cast<std::size_t>(square) * sizeof(DBL));
-    std::memcpy(g, gradient.data(), static_cast<std::size_t>(n) * sizeof(DBL));
-    return AddDampedStep(memory.data(), g, n, *lambda, coefficients.data());
+    std::memcpy(matrix.data(), a.data(), static_cast<std::size_t>(matrix.count()) * sizeof(DBL));
+    std::memcpy(g.data(), gradient.data(), static_cast<std::size_t>(n) * sizeof(DBL));
+    return AddDampedStep(matrix, g, *lambda, coefficients.view());
 }
 
 } // namespace
@@ -131,15 +135,16 @@ using qx::Returned;
 using qx::ValuesInPlace;
 
 ErrorCode LinFit_head(DBL1D y, DBL1D x, DBL1D w, double *slope, double *intercept, double *mse) {
-    return Returned(qx::Line<ValuesInPlace, In<DBL1D>>, y, x, w, slope, intercept, mse);
+    return Returned(qx::StraightLine<ValuesInPlace, In<DBL1D>>, y, x, w, slope, intercept, mse);
 }
 int32_t LinFitCoef_head(DBL1D y, DBL1D x, double *slope, double *intercept, ErrorCode *err) {
-    return InErr(err, qx::Line<CoefficientsOnly, std::nullptr_t>, y, x, nullptr, slope, intercept,
-                 nullptr);
+    return InErr(err, qx::StraightLine<CoefficientsOnly, std::nullptr_t>, y, x, nullptr, slope,
+                 intercept, nullptr);
 }
 int32_t LinFitCoef80_head(DBL1D y, DBL1D x, DBL1D w, double *slope, double *intercept,
                           ErrorCode *err) {
-    return InErr(err, qx::Line<CoefficientsOnly, In<DBL1D>>, y, x, w, slope, intercept, nullptr);
+    return InErr(err, qx::StraightLine<CoefficientsOnly, In<DBL1D>>, y, x, w, slope, intercept,
+                 nullptr);
 }
 
 ErrorCode PolyFit_head(DBL1D x, DBL1D y, int32_t order, int32_t algorithm, DBL1D fit,

@@ -1,21 +1,12 @@
 #include "qx/model_fits.h"
 
+#include "fit/exponential_power.h"
 #include "fit/exports/fit_arguments.h"
 #include "fit/gaussian.h"
-#include "fit/growth.h"
 #include "fit/logarithm.h"
 
 namespace qx {
 namespace {
-
-template <class Y, class Weights>
-bool SizesFit(Y y, In<DBL1D> x, Weights w) {
-    return x.size() == y.size() && WeightsFit(w, y.size());
-}
-
-FitLimits LimitsOf(double tolerance, double floor, OutI32 iterations) {
-    return {tolerance, floor, *iterations.address()};
-}
 
 // Without iteration, as the oldest exports fit.
 template <class Gives, class Deviations>
@@ -26,33 +17,60 @@ Outcome LogLinearExp(typename Gives::Y y, In<DBL1D> x, Deviations deviations, Ou
     SampleWeights weights;
     if (const ErrorCode failed = weights.make(deviations, Given::Deviations))
         return failed;
-    int32_t steps;
-    return FitExponential(x.data(), y.data(), weights.data(), y.size(), Gives::fit(y), a.address(),
-                          b.address(), Gives::mse(mse), 0, nullptr, {}, &steps);
+    DBL p[2] = {};
+    const ErrorCode status = FitExponential(
+        {{x.view(), y.view(), weights.view()}, nullptr, {}, p, nullptr, Gives::output(y, mse)},
+        ExponentialMethod::LogarithmicLine);
+    a = p[0];
+    b = p[1];
+    return status;
+}
+
+// The frame of the others: the sizes, the guess, and the parameters where they belong.
+template <class Gives, std::size_t Count, class Fit>
+Outcome Iterated(typename Gives::Y y, In<DBL1D> x, In<DBL1D> w, double tolerance, In<DBL1D> guessed,
+                 OutDBL (&parameters)[Count], typename Gives::MSE mse, OutI32 iterations,
+                 double floor, const Fit &fit) {
+    if (!SizesFit(y, x, w))
+        return ErrSizeMismatch;
+    const Guess guess(guessed, Count);
+    int32_t *const steps = iterations.address();
+    DBL p[Count] = {};
+    const ErrorCode status = fit(ModelFit{SamplesOf(y, x, w),
+                                          guess.data(),
+                                          {tolerance, floor, *steps},
+                                          p,
+                                          steps,
+                                          Gives::output(y, mse)});
+    for (std::size_t i = 0; i < Count; ++i)
+        parameters[i] = p[i];
+    return guess.merge(status);
 }
 
 template <class Gives>
-Outcome Exp(typename Gives::Y y, In<DBL1D> x, In<DBL1D> w, double tolerance, In<DBL1D> guessed,
+Outcome Exp(typename Gives::Y y, In<DBL1D> x, In<DBL1D> w, double tolerance, In<DBL1D> guess,
             int32_t method, OutDBL a, OutDBL b, typename Gives::MSE mse, OutI32 iterations,
             double floor) {
-    if (!SizesFit(y, x, w))
-        return ErrSizeMismatch;
-    const Guess guess(guessed, 2);
-    return guess.merge(FitExponential(x.data(), y.data(), WeightsOf(w), y.size(), Gives::fit(y),
-                                      a.address(), b.address(), Gives::mse(mse), method,
-                                      guess.data(), LimitsOf(tolerance, floor, iterations),
-                                      iterations.address()));
+    const auto way =
+        method == 0 ? ExponentialMethod::LogarithmicLine : ExponentialMethod::GaussNewton;
+    OutDBL p[] = {a, b};
+    return Iterated<Gives>(y, x, w, tolerance, guess, p, mse, iterations, floor,
+                           [=](const ModelFit &request) { return FitExponential(request, way); });
 }
 
 template <class Gives>
-Outcome Power(typename Gives::Y y, In<DBL1D> x, In<DBL1D> w, double tolerance, In<DBL1D> guessed,
+Outcome Power(typename Gives::Y y, In<DBL1D> x, In<DBL1D> w, double tolerance, In<DBL1D> guess,
               OutDBL a, OutDBL b, typename Gives::MSE mse, OutI32 iterations, double floor) {
-    if (!SizesFit(y, x, w))
-        return ErrSizeMismatch;
-    const Guess guess(guessed, 2);
-    return guess.merge(FitPower(x.data(), y.data(), WeightsOf(w), y.size(), Gives::fit(y),
-                                a.address(), b.address(), Gives::mse(mse), guess.data(),
-                                LimitsOf(tolerance, floor, iterations), iterations.address()));
+    OutDBL p[] = {a, b};
+    return Iterated<Gives>(y, x, w, tolerance, guess, p, mse, iterations, floor, FitPower);
+}
+
+template <class Gives>
+Outcome Gaussian(typename Gives::Y y, In<DBL1D> x, In<DBL1D> w, double tolerance, In<DBL1D> guess,
+                 OutDBL a, OutDBL c, OutDBL s, typename Gives::MSE mse, OutI32 iterations,
+                 double floor) {
+    OutDBL p[] = {a, c, s};
+    return Iterated<Gives>(y, x, w, tolerance, guess, p, mse, iterations, floor, FitGaussian);
 }
 
 template <class Gives>
@@ -60,21 +78,11 @@ Outcome Logarithm(typename Gives::Y y, In<DBL1D> x, In<DBL1D> w, double base, Ou
                   typename Gives::MSE mse) {
     if (!SizesFit(y, x, w))
         return ErrSizeMismatch;
-    return FitLog(x.data(), y.data(), WeightsOf(w), y.size(), Gives::fit(y), base, a.address(),
-                  b.address(), Gives::mse(mse));
-}
-
-template <class Gives>
-Outcome Gaussian(typename Gives::Y y, In<DBL1D> x, In<DBL1D> w, double tolerance, In<DBL1D> guessed,
-                 OutDBL a, OutDBL c, OutDBL s, typename Gives::MSE mse, OutI32 iterations,
-                 double floor) {
-    if (!SizesFit(y, x, w))
-        return ErrSizeMismatch;
-    const Guess guess(guessed, 3);
-    return guess.merge(FitGaussian(x.data(), y.data(), WeightsOf(w), y.size(), Gives::fit(y),
-                                   a.address(), c.address(), s.address(), Gives::mse(mse),
-                                   guess.data(), LimitsOf(tolerance, floor, iterations),
-                                   iterations.address()));
+    DBL p[2] = {};
+    const ErrorCode status = FitLog(SamplesOf(y, x, w), base, p, Gives::output(y, mse));
+    a = p[0];
+    b = p[1];
+    return status;
 }
 
 } // namespace

@@ -38,10 +38,11 @@ ErrorCode CheckSmoothing(In<DBL1D> x, In<DBL1D> y, In<DBL1D> d, int32_t method, 
 }
 
 // Each piece in powers of x - x[i].
-void PiecesOf(const DBL *x, const DBL *values, const DBL *second, int32_t n, DBL *pieces) {
-    for (int32_t i = 0; i + 1 < n; ++i) {
+void FindPieces(ConstRealVector x, ConstRealVector values, ConstRealVector second,
+                RealMatrix pieces) {
+    for (int32_t i = 0; i < pieces.rows(); ++i) {
         const double h = x[i + 1] - x[i];
-        DBL *const piece = pieces + std::ptrdiff_t{4} * i;
+        DBL *const piece = pieces.row(i);
         piece[0] = values[i];
         piece[1] = (values[i + 1] - values[i]) / h - h * (2.0 * second[i] + second[i + 1]) / 6.0;
         piece[2] = second[i] / 2.0;
@@ -68,12 +69,12 @@ Outcome Smooth(In<DBL1D> x, In<DBL1D> y, In<DBL1D> d, int32_t method, double par
         effective = n;
     } else {
         SmoothingSpline spline;
-        if (const ErrorCode failed = spline.make(x.data(), y.data(), WeightsOf(d), n))
+        if (const ErrorCode failed = spline.make(x.view(), y.view(), d.view()))
             return failed;
-        spline.fit(static_cast<Smoothing>(method), parameter, values.data(), second.data(),
+        spline.fit(static_cast<Smoothing>(method), parameter, values.view(), second.view(),
                    lambda.address(), effective.address());
     }
-    PiecesOf(x.data(), values.data(), second.data(), n, coefficients.data());
+    FindPieces(x.view(), values.view(), second.view(), coefficients.view());
     return 0;
 }
 
@@ -121,9 +122,9 @@ Outcome FitSpline(In<DBL1D> x, In<DBL1D> y, In<DBL1D> w, int32_t degree, int32_t
         return bad;
     if (const Outcome bad = values.resize(n))
         return bad;
-    MakeKnots(x.data(), n, degree, inner, given.isEmpty() ? nullptr : given.data(), knots.data());
-    return FitBSpline(x.data(), y.data(), WeightsOf(w), n, degree, knots.data(), count,
-                      coefficients.data(), values.data(), mse.address());
+    MakeKnots(x.view(), degree, given.view(), knots.view());
+    return FitBSpline(SamplesOf(y, x, w), degree, knots.view(), coefficients.view(),
+                      {values.view(), mse.address()});
 }
 
 } // namespace

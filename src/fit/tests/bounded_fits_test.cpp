@@ -118,22 +118,27 @@ struct Sums {
     std::vector<DBL> a, g, jacobian;
 };
 
-Sums SumsAt(const qx::FitModel &model, const qx::FitSamples &samples, const std::vector<DBL> &p,
-            int32_t method) {
+Sums SumsAt(const qx::FitModel &model, const qx::FitSamples &samples, const std::vector<DBL> &at,
+            qx::FitNorm norm) {
     const auto count = static_cast<std::size_t>(model.count);
-    const auto n = static_cast<std::size_t>(samples.n);
+    const auto n = static_cast<std::size_t>(samples.n());
+    std::vector<DBL> p = at;
     Sums sums = {0, std::vector<DBL>(count * count), std::vector<DBL>(count),
                  std::vector<DBL>(n * count)};
-    std::vector<DBL> work(
-        static_cast<std::size_t>(qx::EvaluationWork(samples.n, model.count, method)));
-    if (method == qx::leastSquares)
-        qx::EvalLeastSquares(model, samples, p.data(), sums.a.data(), sums.jacobian.data(),
-                             sums.g.data(), &sums.cost, work.data());
+    qx::FitPoint point = {{p.data(), model.count},
+                          {sums.a.data(), model.count, model.count},
+                          {sums.g.data(), model.count},
+                          0};
+    qx::EvaluationMemory memory(model, samples, norm);
+    EXPECT_EQ(memory.take(samples.n()), 0);
+    if (norm == qx::leastSquares)
+        qx::EvalLeastSquares(model, samples, point, memory,
+                             {sums.jacobian.data(), samples.n(), model.count});
     else
-        EXPECT_EQ(
-            (method == qx::bisquare ? qx::EvalBisquare : qx::EvalLeastAbsolute)(
-                model, samples, p.data(), sums.a.data(), sums.g.data(), &sums.cost, work.data()),
-            0);
+        EXPECT_EQ((norm == qx::bisquare ? qx::EvalBisquare : qx::EvalLeastAbsolute)(model, samples,
+                                                                                    point, memory),
+                  0);
+    sums.cost = point.cost;
     return sums;
 }
 
@@ -157,7 +162,7 @@ TEST_F(BoundedFitSums, DoNotDependOnTheWayToTheDerivatives) {
          {static_cast<const DBL *>(nullptr), static_cast<const DBL *>(w)})
         for (CoreModel core : CoreModels()) {
             SCOPED_TRACE(core.name);
-            const qx::FitSamples samples = {x, y, weights, n};
+            const qx::FitSamples samples = {{x, n}, {y, n}, {weights, weights == nullptr ? 0 : n}};
             const Sums closed = SumsAt(core.model, samples, core.p, qx::leastSquares);
             core.model.normal = nullptr;
             const Sums general = SumsAt(core.model, samples, core.p, qx::leastSquares);
@@ -185,7 +190,8 @@ TEST_F(BoundedFitSums, AreTheSameInLanes) {
                 x[count / 2] += overflow * 4e3;
                 std::vector<DBL> p = core.p;
                 p[1] = overflow == 0 ? p[1] : 1.0;
-                const qx::FitSamples samples = {x, y, count % 2 == 0 ? w : nullptr, count};
+                const qx::FitSamples samples = {
+                    {x, count}, {y, count}, {w, count % 2 == 0 ? count : 0}};
                 DBL a[16], g[4];
                 double cost;
                 core.model.normal(samples, p.data(), core.model.count, &cost, a, nullptr, g,
@@ -207,10 +213,10 @@ TEST_F(BoundedFitSums, AreTheSameInLanes) {
 
 // g is what the cost falls by: n times its derivative is -2 g, or -g for absolute residuals.
 TEST_F(BoundedFitSums, PointDownhill) {
-    for (const int32_t method : {qx::leastSquares, qx::leastAbsolute})
+    for (const qx::FitNorm method : {qx::leastSquares, qx::leastAbsolute})
         for (const CoreModel &core : CoreModels()) {
             SCOPED_TRACE(core.name + std::to_string(method));
-            const qx::FitSamples samples = {x, y, w, n};
+            const qx::FitSamples samples = {{x, n}, {y, n}, {w, n}};
             const Sums sums = SumsAt(core.model, samples, core.p, method);
             for (std::size_t i = 0; i < core.p.size(); ++i) {
                 std::vector<DBL> above = core.p, below = core.p;
@@ -228,7 +234,7 @@ TEST_F(BoundedFitSums, PointDownhill) {
 
 TEST_F(BoundedFitSums, BisquareLeavesOutWhatLiesFarOff) {
     const CoreModel core = CoreModels()[0];
-    const qx::FitSamples samples = {x, y, nullptr, n};
+    const qx::FitSamples samples = {{x, n}, {y, n}, {}};
     y[7] = 50.0;
     const Sums near = SumsAt(core.model, samples, core.p, qx::bisquare);
     y[7] = 5000.0;
@@ -239,7 +245,7 @@ TEST_F(BoundedFitSums, BisquareLeavesOutWhatLiesFarOff) {
     // Residuals without spread leave the weights of the caller.
     for (int i = 0; i < n; ++i)
         y[i] = core.model.value(x[i], core.p.data(), 3, nullptr);
-    const qx::FitSamples exact = {x, y, w, n};
+    const qx::FitSamples exact = {{x, n}, {y, n}, {w, n}};
     const Sums robust = SumsAt(core.model, exact, core.p, qx::bisquare);
     const Sums plain = SumsAt(core.model, exact, core.p, qx::leastSquares);
     for (std::size_t i = 0; i < plain.a.size(); ++i)
@@ -278,7 +284,7 @@ TEST_F(BoundedFitSums, BisquareAllowsForLeverage) {
         const long double u = std::min(1.0L, std::fabs(adjusted[i] / unit));
         cost += (1 - u * u) * (1 - u * u) * r[i] * r[i] / n;
     }
-    const qx::FitSamples samples = {x, y, nullptr, n};
+    const qx::FitSamples samples = {{x, n}, {y, n}, {}};
     EXPECT_NEAR(SumsAt(model, samples, p, qx::bisquare).cost, static_cast<double>(cost), 1e-9);
 }
 
@@ -289,31 +295,31 @@ TEST(BoundedLM, ChecksItsArguments) {
     const auto run = [&](int32_t n, int32_t method, const qx::FitBounds &bounds, DBL *start) {
         int32_t iterations = 10;
         double lambda = 0, mse;
-        return qx::BoundedLM(model, {x, y, nullptr, n}, method, bounds, start, &iterations, 0,
-                             &lambda, nullptr, &mse);
+        return qx::BoundedLM(model, {{x, n}, {y, n}, {}}, method, bounds, start, &iterations, 0,
+                             &lambda, &mse);
     };
-    EXPECT_EQ(run(0, 9, {low, high}, nullptr), ErrEmptyInput);
-    EXPECT_EQ(run(2, 9, {low, high}, nullptr), ErrPolynomialOrderTooHigh);
-    EXPECT_EQ(run(3, 3, {low, high}, nullptr), ErrInvalidSelector);
-    EXPECT_EQ(run(3, 0, {low, high}, nullptr), ErrEmptyInput);
-    EXPECT_EQ(run(3, 0, {low, high}, p), ErrBoundsCrossed);
+    EXPECT_EQ(run(0, 9, {{low, 3}, {high, 3}}, nullptr), ErrEmptyInput);
+    EXPECT_EQ(run(2, 9, {{low, 3}, {high, 3}}, nullptr), ErrPolynomialOrderTooHigh);
+    EXPECT_EQ(run(3, 3, {{low, 3}, {high, 3}}, nullptr), ErrInvalidSelector);
+    EXPECT_EQ(run(3, 0, {{low, 3}, {high, 3}}, nullptr), ErrEmptyInput);
+    EXPECT_EQ(run(3, 0, {{low, 3}, {high, 3}}, p), ErrBoundsCrossed);
     const DBL infinite[] = {inf, inf, inf};
-    EXPECT_EQ(run(3, 0, {infinite, nullptr}, p), ErrNonFiniteInput) << "no finite cost";
+    EXPECT_EQ(run(3, 0, {{infinite, 3}, {}}, p), ErrNonFiniteInput) << "no finite cost";
 }
 
 // Steps are worked off in memory that is taken once, and the limit ends them with the best point.
 TEST(BoundedLM, CountsItsStepsAndTakesMemoryOnce) {
     Fit f = Sampled(exponential, {2, -1, 0.5}, 0, 4, 30, 0.1, 3);
     const qx::FitModel model = qx::FitModelOf<qx::ExponentialModel>();
-    const qx::FitSamples samples = {f.x.data(), f.y.data(), nullptr, 30};
+    const qx::FitSamples samples = {{f.x.data(), 30}, {f.y.data(), 30}, {}};
     Values costs;
     for (const int32_t limit : {0, 1, 3, 200}) {
         DBL p[] = {1, -0.1, 0};
         int32_t iterations = limit;
         double lambda = 0.1, mse;
         const HeapProbe probe;
-        const ErrorCode status = qx::BoundedLM(model, samples, 0, {nullptr, nullptr}, p,
-                                               &iterations, 1e-15, &lambda, nullptr, &mse);
+        const ErrorCode status =
+            qx::BoundedLM(model, samples, 0, {}, p, &iterations, 1e-15, &lambda, &mse);
         EXPECT_EQ(probe.allocations(), HeapProbe::works() ? 2 : 0);
         EXPECT_EQ(status, limit < 200 ? ErrIterationLimit : 0);
         EXPECT_EQ(iterations, limit < 200 ? limit : iterations);
@@ -327,8 +333,7 @@ TEST(BoundedLM, CountsItsStepsAndTakesMemoryOnce) {
     DBL p[] = {0, 0, 2};
     int32_t iterations = -1;
     double lambda = 0, mse;
-    EXPECT_EQ(qx::BoundedLM(model, {x, y, nullptr, 4}, 0, {nullptr, nullptr}, p, &iterations, 0,
-                            &lambda, nullptr, &mse),
+    EXPECT_EQ(qx::BoundedLM(model, {{x, 4}, {y, 4}, {}}, 0, {}, p, &iterations, 0, &lambda, &mse),
               0);
     EXPECT_EQ(mse, 0.0);
 }
@@ -355,8 +360,8 @@ TEST(BoundedLM, DoesNotRepeatAStepWithoutDamping) {
         DBL p[] = {0};
         int32_t iterations = limit;
         double lambda = 0.1, mse;
-        EXPECT_EQ(qx::BoundedLM(model, {x, y, nullptr, 1}, 0, {nullptr, nullptr}, p, &iterations,
-                                1e-300, &lambda, nullptr, &mse),
+        EXPECT_EQ(qx::BoundedLM(model, {{x, 1}, {y, 1}, {}}, 0, {}, p, &iterations, 1e-300, &lambda,
+                                &mse),
                   0);
         ASSERT_LT(calls, 1100);
         EXPECT_EQ(iterations, limit + 1);

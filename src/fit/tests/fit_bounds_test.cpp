@@ -1,4 +1,4 @@
-#include "fit/bounds.h"
+#include "fit/confidence_bounds.h"
 #include "fit/tests/least_squares.h"
 #include "fit/tests/nist_models.h"
 #include "frame/arrays.h"

@@ -335,17 +335,19 @@ TEST(LinearFits, ChecksOfMatricesOfTerms) {
 
 TEST(LinearFits, SolvesUpperTriangles) {
     const DBLArray r({2, 1, 4, 9, 0.5, -1, 9, 9, 4}), v({8, 1, 8}), x({0, 0, 0});
-    EXPECT_EQ(qx::SolveUpperTriangular(r.data(), 3, v.data(), 3, x.data()), 0);
+    const auto solve = [&](const DBLArray &triangle, const DBLArray &to) {
+        return qx::SolveUpperTriangular({triangle.data(), 3, 3}, {v.data(), 3}, {to.data(), 3});
+    };
+    EXPECT_EQ(solve(r, x), 0);
     EXPECT_EQ(x.values(), (Samples{-3, 6, 2}));
     EXPECT_EQ(v[0], 8.0);
-    EXPECT_EQ(qx::SolveUpperTriangular(r.data(), 3, v.data(), 3, nullptr), 0);
+    EXPECT_EQ(solve(r, v), 0);
     EXPECT_EQ(v.values(), x.values());
     for (const double bad : {0.0, nan})
         for (const int at : {0, 4, 8}) {
             const DBLArray broken(r.values());
             broken.data()[at] = bad;
-            EXPECT_EQ(qx::SolveUpperTriangular(broken.data(), 3, v.data(), 3, nullptr),
-                      ErrSingularMatrix);
+            EXPECT_EQ(solve(broken, v), ErrSingularMatrix);
         }
 }
 
@@ -653,10 +655,12 @@ TEST(LinearFits, RobustPolynomialsIgnoreOutliers) {
         for (const auto &[norm, bound] :
              {std::pair(qx::leastSquares, infinity), std::pair(qx::leastAbsolute, 0.01),
               std::pair(qx::bisquare, 0.01)}) {
-            const DBL *const used = isWeighted ? weights.data() : nullptr;
             double mse;
-            ASSERT_EQ(qx::FitPolynomial(DBLArray(x).data(), DBLArray(y).data(), used, 200, 2, 0,
-                                        nullptr, nullptr, 0, fit.data(), c.data(), &mse, norm,
+            const DBLArray xs(x), ys(y);
+            const qx::FitSamples samples = {
+                {xs.data(), 200}, {ys.data(), 200}, {weights.data(), isWeighted ? 200 : 0}};
+            ASSERT_EQ(qx::FitPolynomial(samples, {}, qx::bySVD, {c.data(), 3},
+                                        {{fit.data(), 200}, &mse}, norm,
                                         {1e-6, 0.0, qx::robustIterations}),
                       0);
             double worst = 0.0;
@@ -669,30 +673,34 @@ TEST(LinearFits, RobustPolynomialsIgnoreOutliers) {
         }
 }
 
+qx::ConstRealVector ViewOf(const DBLArray &array) {
+    return {array.data(), static_cast<std::ptrdiff_t>(array.values().size())};
+}
+
 TEST(LinearFits, WeightsOfRobustNorms) {
     DBLArray out(6);
+    const qx::RealVector weights(out.data(), 6);
     const DBLArray residuals({-2, 1, 0, 0.001, 4, -1}), w({1, -2, 3, 1, 1, 1});
-    ASSERT_EQ(qx::LeastAbsoluteWeights(residuals.data(), w.data(), 6, out.data()), 0);
+    ASSERT_EQ(qx::LeastAbsoluteWeights(ViewOf(residuals), ViewOf(w), weights), 0);
     EXPECT_EQ(out.values(), (Samples{0.5, 2, 300, 100, 0.25, 1}));
-    const DBLArray exact({0, 0, 0, 0, 0, 0});
-    ASSERT_EQ(qx::LeastAbsoluteWeights(exact.data(), nullptr, 6, out.data()), 0);
+    const DBLArray exact({0, 0, 0, 0, 0, 0}), ones({1, 1, 1, 1, 1, 1});
+    ASSERT_EQ(qx::LeastAbsoluteWeights(ViewOf(exact), {}, weights), 0);
     EXPECT_EQ(out[0], 1.0 / 1e-07);
     // Without scale, or where most samples would be lost, the weights stay.
-    const DBLArray adjusted(exact.values());
-    ASSERT_EQ(qx::BisquareWeights(adjusted.data(), w.data(), 6, 2, out.data()), 0);
+    ASSERT_EQ(qx::BisquareWeights(ViewOf(exact), ViewOf(ones), ViewOf(w), 2, weights), 0);
     EXPECT_EQ(out.values(), (Samples{1, 2, 3, 1, 1, 1}));
-    const DBLArray spread({-1, 1, 1.2, -1.1, 1e6, 0.9});
-    ASSERT_EQ(qx::BisquareWeights(spread.data(), nullptr, 6, 6, out.data()), 0);
+    const DBLArray spread({-1, 1, 0.6, -1.1, 5e5, 0.9}), factors({1, 1, 2, 1, 2, 1});
+    ASSERT_EQ(qx::BisquareWeights(ViewOf(spread), ViewOf(factors), {}, 6, weights), 0);
     EXPECT_EQ(out[4], 1.0);
-    ASSERT_EQ(qx::BisquareWeights(spread.data(), nullptr, 6, 5, out.data()), 0);
+    ASSERT_EQ(qx::BisquareWeights(ViewOf(spread), ViewOf(factors), {}, 5, weights), 0);
     EXPECT_EQ(out[4], 0.0);
     EXPECT_GT(out[0], 0.5);
-    const DBLArray broken({1, nan, 2});
-    EXPECT_EQ(qx::BisquareWeights(broken.data(), nullptr, 3, 1, out.data()), ErrNaNInData);
-    EXPECT_EQ(qx::LeastAbsoluteWeights(broken.data(), nullptr, 3, out.data()), ErrNaNInData);
+    const DBLArray broken({1, nan, 2, 1, 1, 1});
+    EXPECT_EQ(qx::BisquareWeights(ViewOf(broken), ViewOf(ones), {}, 1, weights), ErrNaNInData);
+    EXPECT_EQ(qx::LeastAbsoluteWeights(ViewOf(broken), {}, weights), ErrNaNInData);
     // Leverages from 0.9999 on count as one.
-    const DBLArray leverage({0.0, 0.75, 0.9999999, 1.0});
-    qx::LeverageFactors(leverage.data(), nullptr, 4, leverage.data());
+    DBLArray leverage({0.0, 0.75, 0.9999999, 1.0});
+    qx::LeverageFactors(ViewOf(leverage), {}, {leverage.data(), 4});
     EXPECT_EQ(leverage[1], 2.0);
     EXPECT_NEAR(leverage[2], 100.0, 1e-9);
     EXPECT_EQ(leverage[3], leverage[2]);

@@ -186,7 +186,8 @@ struct NistProblem {
                 nullptr, nullptr, this};
     }
     FitSamples samples() const {
-        return {number.data(), target.data(), nullptr, static_cast<int32_t>(target.size())};
+        const auto n = static_cast<std::ptrdiff_t>(target.size());
+        return {{number.data(), n}, {target.data(), n}, {}};
     }
     struct Result {
         double digits, squares;
@@ -196,8 +197,8 @@ struct NistProblem {
         std::vector<DBL> p(set.starts[start].begin(), set.starts[start].end());
         int32_t iterations = 2000;
         double lambda = 0.1, mse = 0;
-        BoundedLM(model(), samples(), leastSquares, {nullptr, nullptr}, p.data(), &iterations,
-                  1e-15, &lambda, nullptr, &mse);
+        BoundedLM(model(), samples(), leastSquares, {}, p.data(), &iterations, 1e-15, &lambda,
+                  &mse);
         return {digits({p.begin(), p.end()}), mse * static_cast<double>(target.size()), iterations};
     }
     // The digits to which all parameters agree with the certified ones, of the 11 that there are.

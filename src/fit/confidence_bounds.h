@@ -1,7 +1,8 @@
-#ifndef QX_FIT_BOUNDS_INNER_H
-#define QX_FIT_BOUNDS_INNER_H
+#ifndef QX_FIT_CONFIDENCE_BOUNDS_H
+#define QX_FIT_CONFIDENCE_BOUNDS_H
 
 #include "fit/model_rows.h"
+#include "frame/views.h"
 #include "qx/errors.h"
 
 namespace qx {
@@ -16,24 +17,21 @@ double TwoSidedT(double confidence, double dof);
 // as the target the value of the model; w are the weights, of which `used` are not 0.
 struct FittedModel {
     LinearModel linear;
-    const DBL *y;
+    ConstRealVector y;
     int32_t used;
 };
-
-// The weights that count: all where w is null.
-int32_t CountUsed(const DBL *w, int32_t n);
 
 enum class BoundsOf { Curve, Observation };
 
 // lower and upper = f -+ t s sqrt(j' (J' W J)^-1 j [+ 1 for an observation]) at each sample, with
-// s^2 = sum of |w| (y - f)^2 over (used - k), and likewise halfWidths (k elements, or null) = t s
+// s^2 = sum of |w| (y - f)^2 over (used - k), and likewise halfWidths (k elements, or none) = t s
 // sqrt of the diagonal of (J' W J)^-1. From the triangle R of J without Q: j' (J' W J)^-1 j is the
 // square of R^-T j. Needs used > k.
 //
 // ErrNonFiniteInput (a derivative, value or weighted residual of the model), ErrSingularMatrix (a
 // column of the weighted J depends on those before it within some eps), ErrOutOfMemory.
-ErrorCode BoundsOfFit(const FittedModel &model, double confidence, BoundsOf what, DBL *halfWidths,
-                      DBL *lower, DBL *upper);
+ErrorCode BoundsOfFit(const FittedModel &model, double confidence, BoundsOf what,
+                      RealVector halfWidths, RealVector lower, RealVector upper);
 
 } // namespace qx
 

@@ -1,4 +1,4 @@
-#include "fit/growth.h"
+#include "fit/exponential_power.h"
 
 #include "fit/general.h"
 #include "fit/residuals.h"
@@ -15,9 +15,8 @@ namespace {
 
 // What exponential and power have in common: y = a g(b), g = exp(b t), with t = x or t = ln x. The
 // derivatives are g and a t g.
-struct GrowthData {
-    const DBL *x, *t, *y, *w;
-    int32_t n;
+struct GrowthData : FitSamples {
+    ConstRealVector t;
 };
 double Exponential(const GrowthData &data, double b, int32_t i) { return std::exp(b * data.x[i]); }
 double Power(const GrowthData &data, double b, int32_t i) { return std::pow(data.x[i], b); }
@@ -27,10 +26,10 @@ struct Parameters {
 };
 
 // +1, or -1 where more values are negative than positive.
-double DataSign(const DBL *y, int32_t n) {
+double DataSign(ConstRealVector y) {
     int32_t balance = 0;
-    for (int32_t i = 0; i < n; ++i)
-        balance += (y[i] > 0.0) - (y[i] < 0.0);
+    for (const double v : y)
+        balance += (v > 0.0) - (v < 0.0);
     return balance < 0 ? -1.0 : 1.0;
 }
 
@@ -38,7 +37,7 @@ double DataSign(const DBL *y, int32_t n) {
 // |w| y^2; the others are rows of zeros.
 ErrorCode FitLogarithms(const GrowthData &data, double sign, DBL *pq) {
     int32_t count = 0;
-    for (int32_t i = 0; i < data.n; ++i)
+    for (int32_t i = 0; i < data.n(); ++i)
         count += sign * data.y[i] > 0.0;
     if (count < 2)
         return ErrPolynomialOrderTooHigh;
@@ -47,13 +46,13 @@ ErrorCode FitLogarithms(const GrowthData &data, double sign, DBL *pq) {
             const int32_t i = block.first + k;
             const double size = sign * data.y[i];
             const bool isUsed = size > 0.0;
-            const double root = data.w == nullptr ? size : size * std::sqrt(std::fabs(data.w[i]));
+            const double root = data.w.isEmpty() ? size : size * std::sqrt(std::fabs(data.w[i]));
             block.column(0)[k] = isUsed ? root : 0.0;
             block.column(1)[k] = isUsed ? root * data.t[i] : 0.0;
             block.column(2)[k] = isUsed ? root * std::log(size) : 0.0;
         }
     };
-    return SolveLinearModel({writeRows, data.n, 2, nullptr}, bySVD, pq, nullptr);
+    return SolveLinearModel({writeRows, data.n(), 2, nullptr}, bySVD, pq, nullptr);
 }
 
 // Where a step follows from the parameters alone, parameters that come back come back for ever:
@@ -87,15 +86,15 @@ private:
 template <double (*G)(const GrowthData &, double, int32_t)>
 class Iteration {
 public:
-    Iteration(const GrowthData &data, DBL *values) : data_(data), values_(values) {}
+    Iteration(const GrowthData &data, RealVector values) : data_(data), values_(values) {}
 
     double mseAt(double a, double b) {
-        SquaredResiduals squares(data_.w);
-        for (int32_t i = 0; i < data_.n; ++i) {
+        SquaredResiduals squares(data_);
+        for (int32_t i = 0; i < data_.n(); ++i) {
             values_[i] = G(data_, b, i);
-            squares.add(i, data_.y[i], a * values_[i]);
+            squares.add(i, a * values_[i]);
         }
-        return squares.mean(data_.n);
+        return squares.mean();
     }
 
     ErrorCode step(Parameters *at) {
@@ -108,7 +107,7 @@ public:
             }
         };
         DBL change[2];
-        const LinearModel model = {writeRows, data_.n, 2, data_.w};
+        const LinearModel model = {writeRows, data_.n(), 2, data_.weights()};
         if (const ErrorCode failed = SolveLinearModel(model, bySVD, change, nullptr))
             return failed;
         at->a += change[0];
@@ -147,88 +146,79 @@ public:
 
 private:
     const GrowthData &data_;
-    DBL *values_;
+    const RealVector values_;
 };
 
-// `fit` may be y.
-template <double (*G)(const GrowthData &, double, int32_t)>
-void Evaluate(const GrowthData &data, const Parameters &at, DBL *fit, DBL *mse) {
-    if (fit == nullptr && mse == nullptr)
-        return;
-    SquaredResiduals squares(data.w);
-    for (int32_t i = 0; i < data.n; ++i) {
-        const double f = at.a * G(data, at.b, i);
-        squares.add(i, data.y[i], f);
-        if (fit != nullptr)
-            fit[i] = f;
-    }
-    if (mse != nullptr)
-        *mse = squares.mean(data.n);
-}
-
 // From the guess, or the line through the logarithms, or both where the guess is of no use.
-ErrorCode FindStart(const GrowthData &data, const DBL *guess, bool needsLine, Parameters *start) {
-    if (guess == nullptr || needsLine || CheckFinite(guess, 2) != 0) {
-        const double sign = DataSign(data.y, data.n);
+ErrorCode FindStart(const GrowthData &data, const DBL *guess, Parameters *start) {
+    if (guess == nullptr || CheckFinite(guess, 2) != 0) {
+        const double sign = DataSign(data.y);
         DBL pq[2];
         if (const ErrorCode failed = FitLogarithms(data, sign, pq))
             return failed;
         *start = {sign * std::exp(pq[0]), pq[1], 0.0};
     }
     // kept: also a guess that is not finite
-    if (guess != nullptr && !needsLine)
+    if (guess != nullptr)
         *start = {guess[0], guess[1], 0.0};
     return 0;
 }
 
+template <double (*G)(const GrowthData &, double, int32_t)>
+ErrorCode Iterate(const GrowthData &data, const ModelFit &request, RealVector values,
+                  Parameters *found) {
+    return Iteration<G>(data, values).run(request.limits.settled(), found, request.steps);
+}
+
+template <double (*G)(const GrowthData &, double, int32_t)>
+void Return(const GrowthData &data, const ModelFit &request, const Parameters &found) {
+    EvaluateFit(data, request.out, [&](int32_t i) { return found.a * G(data, found.b, i); });
+    request.p[0] = found.a;
+    request.p[1] = found.b;
+}
+
 } // namespace
 
-ErrorCode FitExponential(const DBL *x, const DBL *y, const DBL *w, int32_t n, DBL *fit, DBL *a,
-                         DBL *b, DBL *mse, int32_t method, const DBL *guess,
-                         const FitLimits &limits, int32_t *steps) {
-    if (const ErrorCode failed = SettleWeights(n, 2, &w))
+ErrorCode FitExponential(const ModelFit &request, ExponentialMethod method) {
+    GrowthData data = {request.samples, request.samples.x};
+    if (const ErrorCode failed = SettleWeights(&data, 2))
         return failed;
-    const GrowthData data = {x, x, y, w, n};
+    const bool isIterated = method == ExponentialMethod::GaussNewton;
     Parameters found = {};
-    if (const ErrorCode failed = FindStart(data, guess, method == 0, &found))
+    if (const ErrorCode failed = FindStart(data, isIterated ? request.guess : nullptr, &found))
         return failed;
-    if (method != 0) {
+    if (isIterated) {
         Scratch<ElementType::DBL> values;
-        if (const ErrorCode failed = values.allocate(n))
+        if (const ErrorCode failed = values.allocate(data.n()))
             return failed;
-        Iteration<Exponential> iteration(data, values.data());
-        if (const ErrorCode failed = iteration.run(limits.settled(), &found, steps))
+        if (const ErrorCode failed =
+                Iterate<Exponential>(data, request, {values.data(), data.n()}, &found))
             return failed;
     }
-    *a = found.a;
-    *b = found.b;
-    Evaluate<Exponential>(data, found, fit, mse);
+    Return<Exponential>(data, request, found);
     return 0;
 }
 
-ErrorCode FitPower(const DBL *x, const DBL *y, const DBL *w, int32_t n, DBL *fit, DBL *a, DBL *b,
-                   DBL *mse, const DBL *guess, const FitLimits &limits, int32_t *steps) {
-    if (const ErrorCode failed = SettleWeights(n, 2, &w))
+ErrorCode FitPower(const ModelFit &request) {
+    GrowthData data = {request.samples, {}};
+    if (const ErrorCode failed = SettleWeights(&data, 2))
         return failed;
-    for (int32_t i = 0; i < n; ++i)
-        if (!(x[i] > 0.0))
+    for (const double x : data.x)
+        if (!(x > 0.0))
             return ErrNotStrictlyPositive;
-    Scratch<ElementType::DBL> memory;
-    if (const ErrorCode failed = memory.allocate(2 * int64_t{n}))
+    RealVector values, logarithms;
+    ScratchParts memory;
+    if (const ErrorCode failed = memory.take(Sized(values, data.n()), Sized(logarithms, data.n())))
         return failed;
-    DBL *const logarithms = memory.data() + n;
-    for (int32_t i = 0; i < n; ++i)
-        logarithms[i] = std::log(x[i]);
-    const GrowthData data = {x, logarithms, y, w, n};
+    for (int32_t i = 0; i < data.n(); ++i)
+        logarithms[i] = std::log(data.x[i]);
+    data.t = logarithms;
     Parameters found = {};
-    if (const ErrorCode failed = FindStart(data, guess, false, &found))
+    if (const ErrorCode failed = FindStart(data, request.guess, &found))
         return failed;
-    Iteration<Power> iteration(data, memory.data());
-    if (const ErrorCode failed = iteration.run(limits.settled(), &found, steps))
+    if (const ErrorCode failed = Iterate<Power>(data, request, values, &found))
         return failed;
-    *a = found.a;
-    *b = found.b;
-    Evaluate<Power>(data, found, fit, mse);
+    Return<Power>(data, request, found);
     return 0;
 }
 

@@ -1,4 +1,4 @@
-#include "fit/bounds.h"
+#include "fit/confidence_bounds.h"
 
 #include "fit/elimination.h"
 #include "frame/constants.h"
@@ -27,10 +27,11 @@ bool HasFullRank(const Elimination &triangle, int32_t k) {
     return true;
 }
 
-// lengths[i] = the length of row i of R^-1, whose elements solve v R = e_i'. v: k elements of work.
-void RowLengthsOfInverse(const Elimination &triangle, int32_t k, DBL *v, DBL *lengths) {
+// lengths[i] = the length of row i of R^-1, whose elements solve v R = e_i'. v is work.
+void RowLengthsOfInverse(const Elimination &triangle, RealVector v, RealVector lengths) {
+    const auto k = static_cast<int32_t>(v.size());
     for (int32_t i = 0; i < k; ++i) {
-        Fill(v, k, 0.0);
+        Fill(v.data(), k, 0.0);
         v[i] = 1.0;
         double squares = 0.0, scale = 0.0;
         for (int32_t j = i; j < k; ++j) {
@@ -48,9 +49,9 @@ void RowLengthsOfInverse(const Elimination &triangle, int32_t k, DBL *v, DBL *le
 
 // The columns of the block become those of J R^-1, and lengths[i] the length of its row i.
 void RowLengthsThroughTriangle(const Elimination &triangle, int32_t k, const RowBlock &block,
-                               DBL *lengths) {
+                               RealVector lengths) {
     const int32_t count = block.count;
-    Fill(lengths, count, 0.0);
+    Fill(lengths.data(), count, 0.0);
     for (int32_t j = 0; j < k; ++j) {
         DBL *const column = block.column(j);
         for (int32_t i = 0; i < j; ++i) {
@@ -71,7 +72,7 @@ void RowLengthsThroughTriangle(const Elimination &triangle, int32_t k, const Row
 
 // The root of the sum of |w| (y - f)^2 over dof, without overflow on the way. NaN or infinite where
 // a residual is.
-double ResidualDeviation(const FittedModel &model, const DBL *f, int32_t dof) {
+double ResidualDeviation(const FittedModel &model, ConstRealVector f, int32_t dof) {
     const DBL *const w = model.linear.w;
     const auto weighted = [&](int32_t i) {
         const double residual = model.y[i] - f[i];
@@ -105,17 +106,8 @@ double TwoSidedT(double confidence, double dof) {
     return SquareRoot(Extended{dof, 0.0} * (point.y / point.x)).high;
 }
 
-int32_t CountUsed(const DBL *w, int32_t n) {
-    if (w == nullptr)
-        return n;
-    int32_t used = 0;
-    for (int32_t i = 0; i < n; ++i)
-        used += w[i] != 0.0;
-    return used;
-}
-
-ErrorCode BoundsOfFit(const FittedModel &model, double confidence, BoundsOf what, DBL *halfWidths,
-                      DBL *lower, DBL *upper) {
+ErrorCode BoundsOfFit(const FittedModel &model, double confidence, BoundsOf what,
+                      RealVector halfWidths, RealVector lower, RealVector upper) {
     const int32_t n = model.linear.n, k = model.linear.k;
     Elimination triangle;
     if (const ErrorCode failed = triangle.reduce(model.linear))
@@ -129,13 +121,13 @@ ErrorCode BoundsOfFit(const FittedModel &model, double confidence, BoundsOf what
         return failed;
     RowBlock block;
     while (stream.next(&block)) {
-        std::memcpy(upper + block.first, block.column(k),
+        std::memcpy(upper.data() + block.first, block.column(k),
                     static_cast<std::size_t>(block.count) * sizeof(DBL));
-        RowLengthsThroughTriangle(triangle, k, block, lower + block.first);
+        RowLengthsThroughTriangle(triangle, k, block, lower.part(block.first, block.count));
     }
     const int32_t dof = model.used - k;
     const double deviation = ResidualDeviation(model, upper, dof);
-    if (!std::isfinite(deviation) || CheckFinite(upper, n) != 0)
+    if (!std::isfinite(deviation) || CheckFinite(upper.data(), n) != 0)
         return ErrNonFiniteInput;
 
     const double width = TwoSidedT(confidence, dof) * deviation;
@@ -146,12 +138,12 @@ ErrorCode BoundsOfFit(const FittedModel &model, double confidence, BoundsOf what
         lower[i] = f - half;
         upper[i] = f + half;
     }
-    if (halfWidths == nullptr)
+    if (halfWidths.isEmpty())
         return 0;
     Scratch<ElementType::DBL> work;
     if (const ErrorCode failed = work.allocate(k))
         return failed;
-    RowLengthsOfInverse(triangle, k, work.data(), halfWidths);
+    RowLengthsOfInverse(triangle, {work.data(), k}, halfWidths);
     for (int32_t i = 0; i < k; ++i)
         halfWidths[i] *= width;
     return 0;

@@ -1,0 +1,28 @@
+#ifndef QX_FIT_SAMPLES_H
+#define QX_FIT_SAMPLES_H
+
+#include "frame/views.h"
+
+#include <cmath>
+
+namespace qx {
+
+// What is fitted: as many x as y, and as many weights, of which the absolute value counts, or none.
+struct FitSamples {
+    ConstRealVector x, y, w;
+
+    int32_t n() const { return static_cast<int32_t>(y.size()); }
+    double weight(int32_t i) const { return w.isEmpty() ? 1.0 : std::fabs(w[i]); }
+    const DBL *weights() const { return w.isEmpty() ? nullptr : w.data(); } // null for none
+};
+
+// What a fit gives beside its parameters: its values, for which y may be the place, and the mean
+// of |w| (y - f)^2. Either may be absent.
+struct FitOutput {
+    RealVector values;
+    DBL *mse = nullptr;
+};
+
+} // namespace qx
+
+#endif
