@@ -92,15 +92,16 @@ int main() {
             for (const double value : a)
                 coefficients.push_back({value, 0.0});
             std::vector<int32_t> times(a.size());
-            int32_t count = 0, otherCount = 0;
+            int32_t count = 0;
             const auto seconds = LeastTimes(
                 [&] {
-                    qx::CxPolynomialRoots(coefficients.data(), n, 100, roots.data(), &count);
+                    qx::CxPolynomialRoots({coefficients.data(), n}, 100, {roots.data(), n}, &count);
                     Keep(roots[0]);
                 },
                 [&] {
-                    qx::MultipleRootsComplex(coefficients.data(), n, 1, 0.0, roots.data(), &count,
-                                             simple.data(), times.data(), &otherCount);
+                    qx::MultipleRoots found = {
+                        {roots.data(), n}, {simple.data(), n}, {times.data(), n}};
+                    qx::FindMultipleRoots({coefficients.data(), n}, true, 0.0, &found);
                     Keep(roots[0]);
                 });
             const double peer = PeerSeconds(a);

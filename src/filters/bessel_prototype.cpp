@@ -58,7 +58,7 @@ ErrorCode BesselCutoffScale(const DBL *c, int32_t n, double &scale) {
         polynomial[count - 1 - i] = {evenSquare[i] + oddSquare[i] - (i == 0 ? 2.0 : 0.0), 0.0};
     int32_t roots = 0;
     if (const ErrorCode failed =
-            CxPolynomialRoots(polynomial.data(), count, 100, polynomial.data(), &roots))
+            CxPolynomialRoots({polynomial.data(), count}, 100, {polynomial.data(), count}, &roots))
         return failed;
     scale = 0.0;
     for (int32_t i = 0; i < roots; ++i)

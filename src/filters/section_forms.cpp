@@ -79,9 +79,9 @@ double Factors::deviation(const CDB *polynomial) const {
 ErrorCode Factors::findWithin(double tolerance, const CDB *polynomial) {
     CDB refined[5], roots[5];
     I32 multiplicity[5];
-    int32_t refinedCount = 0, count = 0;
-    const ErrorCode status = MultipleRootsComplex(polynomial, 5, 0, tolerance, refined,
-                                                  &refinedCount, roots, multiplicity, &count);
+    MultipleRoots found = {{refined, 5}, {roots, 5}, {multiplicity, 5}};
+    const ErrorCode status = FindMultipleRoots({polynomial, 5}, false, tolerance, &found);
+    const int32_t count = found.count;
     if (status == ErrOutOfMemory)
         return status;
     int32_t degree = 0;

@@ -12,37 +12,6 @@ namespace qx {
 
 namespace {
 
-constexpr auto Real = ElementType::DBL;
-constexpr auto Complex = ElementType::CDB;
-
-template <ElementType E>
-int32_t Length(const ElementOf<E> *p, int32_t n) {
-    while (n > 0 && IsZero(p[n - 1]))
-        --n;
-    return n;
-}
-
-// The window slides along the longer one; either way the index of p ascends.
-template <ElementType E>
-void Product(const ElementOf<E> *p, int32_t m, const ElementOf<E> *q, int32_t n, ElementOf<E> *r) {
-    const int32_t count = m + n - 1;
-    if (m < n)
-        SlidingSums({{p}, m, {q + (n - 1), -1}, n, 1 - int64_t{m}, {r + (count - 1), -1}, count});
-    else
-        SlidingSums({{q + (n - 1), -1}, n, {p}, m, 1 - int64_t{n}, {r}, count});
-}
-
-template <ElementType E>
-void Divide(ElementOf<E> *work, int32_t m, const ElementOf<E> *q, int32_t n,
-            ElementOf<E> *quotient) {
-    for (std::ptrdiff_t k = m - n; k >= 0; --k) {
-        const typename ScalarOf<E>::type factor = Quotient(work[k + n - 1], q[n - 1]);
-        quotient[k] = factor;
-        for (std::ptrdiff_t j = 0; j < n - 1; ++j)
-            work[k + j] -= factor * q[j];
-    }
-}
-
 // x (k + 1) ... (k + order), in twice the precision and with an exponent apart.
 double TimesFactorials(double x, int32_t k, int32_t order) {
     if (x == 0.0)
@@ -65,62 +34,77 @@ CDB TimesFactorialsOf(CDB x, int32_t k, int32_t order) {
     return {TimesFactorials(x.re, k, order), TimesFactorials(x.im, k, order)};
 }
 
+} // namespace
+
 template <ElementType E>
-void DifferentiateAny(const ElementOf<E> *p, int32_t n, int32_t order, ElementOf<E> *q) {
-    for (int32_t k = 0; k < n - order; ++k)
+int32_t LengthWithoutZeros(ConstVectorView<E> p) {
+    auto n = static_cast<int32_t>(p.size());
+    while (n > 0 && IsZero(p[n - 1]))
+        --n;
+    return n;
+}
+
+// The window slides along the longer one; either way the index of p ascends.
+template <ElementType E>
+void PolynomialProduct(ConstVectorView<E> p, ConstVectorView<E> q, VectorView<E> r) {
+    const auto m = static_cast<int32_t>(p.size()), n = static_cast<int32_t>(q.size());
+    const int32_t count = m + n - 1;
+    QX_EXPECTS(m > 0 && n > 0 && r.size() == count);
+    const ElementOf<E> *const lastOfQ = q.data() + (n - 1);
+    if (m < n)
+        SlidingSums(
+            {{p.data()}, m, {lastOfQ, -1}, n, 1 - int64_t{m}, {r.data() + (count - 1), -1}, count});
+    else
+        SlidingSums({{lastOfQ, -1}, n, {p.data()}, m, 1 - int64_t{n}, {r.data()}, count});
+}
+
+template <ElementType E>
+void DivideInPlace(VectorView<E> work, ConstVectorView<E> q, VectorView<E> quotient) {
+    const std::ptrdiff_t n = q.size();
+    QX_EXPECTS(n > 0 && work.size() >= n && quotient.size() == work.size() - n + 1);
+    for (std::ptrdiff_t k = quotient.size() - 1; k >= 0; --k) {
+        const typename ScalarOf<E>::type factor = Quotient(work[k + n - 1], q[n - 1]);
+        quotient[k] = factor;
+        for (std::ptrdiff_t j = 0; j < n - 1; ++j)
+            work[k + j] -= factor * q[j];
+    }
+}
+
+template <ElementType E>
+void Differentiate(ConstVectorView<E> p, int32_t order, VectorView<E> q) {
+    QX_EXPECTS(order >= 0 && q.size() == p.size() - order);
+    for (int32_t k = 0; k < q.size(); ++k)
         q[k] = TimesFactorialsOf(p[k + order], k, order);
 }
 
 template <ElementType E>
-ErrorCode ComposeAny(const ElementOf<E> *p, int32_t m, const ElementOf<E> *q, int32_t n,
-                     ElementOf<E> *r) {
-    const std::ptrdiff_t full = std::ptrdiff_t{m - 1} * (n - 1) + 1;
+ErrorCode Compose(ConstVectorView<E> p, ConstVectorView<E> q, VectorView<E> r) {
+    QX_EXPECTS(r.size() == (p.size() - 1) * (q.size() - 1) + 1);
     Scratch<E> work;
-    if (const ErrorCode failed = work.allocate(full))
+    if (const ErrorCode failed = work.allocate(r.size()))
         return failed;
-    r[0] = p[m - 1];
-    int32_t length = 1;
-    for (std::ptrdiff_t i = m - 2; i >= 0; --i) {
-        PolynomialProduct(r, length, q, n, work.data());
-        length += n - 1;
+    r[0] = p[p.size() - 1];
+    std::ptrdiff_t length = 1;
+    for (std::ptrdiff_t i = p.size() - 2; i >= 0; --i) {
+        const VectorView<E> product(work.data(), length + q.size() - 1);
+        PolynomialProduct<E>(r.part(0, length), q, product);
+        length = product.size();
         for (std::ptrdiff_t j = 0; j < length; ++j)
-            r[j] = work[j];
+            r[j] = product[j];
         r[0] = r[0] + p[i];
     }
     return work.release();
 }
 
-} // namespace
-
-int32_t LengthWithoutZeros(const DBL *p, int32_t n) { return Length<Real>(p, n); }
-int32_t LengthWithoutZeros(const CDB *p, int32_t n) { return Length<Complex>(p, n); }
-
-void PolynomialProduct(const DBL *p, int32_t m, const DBL *q, int32_t n, DBL *r) {
-    Product<Real>(p, m, q, n, r);
-}
-void PolynomialProduct(const CDB *p, int32_t m, const CDB *q, int32_t n, CDB *r) {
-    Product<Complex>(p, m, q, n, r);
-}
-
-void DivideInPlace(DBL *work, int32_t m, const DBL *q, int32_t n, DBL *quotient) {
-    Divide<Real>(work, m, q, n, quotient);
-}
-void DivideInPlace(CDB *work, int32_t m, const CDB *q, int32_t n, CDB *quotient) {
-    Divide<Complex>(work, m, q, n, quotient);
-}
-
-void Differentiate(const DBL *p, int32_t n, int32_t order, DBL *q) {
-    DifferentiateAny<Real>(p, n, order, q);
-}
-void Differentiate(const CDB *p, int32_t n, int32_t order, CDB *q) {
-    DifferentiateAny<Complex>(p, n, order, q);
-}
-
-ErrorCode Compose(const DBL *p, int32_t m, const DBL *q, int32_t n, DBL *r) {
-    return ComposeAny<Real>(p, m, q, n, r);
-}
-ErrorCode Compose(const CDB *p, int32_t m, const CDB *q, int32_t n, CDB *r) {
-    return ComposeAny<Complex>(p, m, q, n, r);
-}
+template int32_t LengthWithoutZeros(ConstRealVector);
+template int32_t LengthWithoutZeros(ConstComplexVector);
+template void PolynomialProduct(ConstRealVector, ConstRealVector, RealVector);
+template void PolynomialProduct(ConstComplexVector, ConstComplexVector, ComplexVector);
+template void DivideInPlace(RealVector, ConstRealVector, RealVector);
+template void DivideInPlace(ComplexVector, ConstComplexVector, ComplexVector);
+template void Differentiate(ConstRealVector, int32_t, RealVector);
+template void Differentiate(ConstComplexVector, int32_t, ComplexVector);
+template ErrorCode Compose(ConstRealVector, ConstRealVector, RealVector);
+template ErrorCode Compose(ConstComplexVector, ConstComplexVector, ComplexVector);
 
 } // namespace qx

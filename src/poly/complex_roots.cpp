@@ -255,13 +255,13 @@ void CxQuadraticRoots(CDB c, CDB b, CDB a, CDB *roots) {
     roots[1] = Quotient(c * -2.0, larger);
 }
 
-ErrorCode CxPolynomialRoots(const CDB *coef, int32_t n, int32_t maxIterations, CDB *roots,
+ErrorCode CxPolynomialRoots(ConstComplexVector coef, int32_t maxIterations, ComplexVector roots,
                             int32_t *rootCount) {
-    if (n < 1)
-        return ErrEmptyInput;
-    for (int32_t k = 0; k < n; ++k)
-        if (IsNaN(coef[k]))
+    QX_EXPECTS(!coef.isEmpty() && roots.size() >= coef.size() - 1);
+    for (const CDB coefficient : coef)
+        if (IsNaN(coefficient))
             return ErrBadCoefficients;
+    auto n = static_cast<int32_t>(coef.size());
     while (n > 0 && IsZero(coef[n - 1]))
         --n;
     if (n < 2)
@@ -276,7 +276,7 @@ ErrorCode CxPolynomialRoots(const CDB *coef, int32_t n, int32_t maxIterations, C
         roots[zeros++] = {0.0, 0.0};
     *rootCount = n - 1;
     const ErrorCode status =
-        TakeRoots(&work[zeros], n - zeros, &work[n], maxIterations, roots + zeros);
+        TakeRoots(&work[zeros], n - zeros, &work[n], maxIterations, &roots[zeros]);
     return Merge(status, work.release());
 }
 

@@ -1,22 +1,22 @@
 #ifndef QX_POLY_COMPLEX_ROOTS_H
 #define QX_POLY_COMPLEX_ROOTS_H
 
+#include "frame/views.h"
 #include "qx/errors.h"
-#include "qx/types.h"
 
 #include <cstdint>
 
 namespace qx {
 
-// All roots of a complex polynomial of n ascending coefficients, in the order in which they are
-// found: Newton's method with a line search and steps that turn where it leads nowhere, and
-// deflation. `roots` has n places and may be `coef`; *rootCount is the degree, which counts no
-// vanishing top coefficients. A search may turn `maxIterations` times between two of its steps. It
-// can be stuck where the polynomial is flat to the last bit.
+// All roots of a complex polynomial of ascending coefficients, at least one, in the order in which
+// they are found: Newton's method with a line search and steps that turn where it leads nowhere,
+// and deflation. `roots` has as many places and may be `coef`; *rootCount is the degree, which
+// counts no vanishing top coefficients. A search may turn `maxIterations` times between two of its
+// steps. It can be stuck where the polynomial is flat to the last bit.
 //
-// ErrEmptyInput; ErrBadCoefficients: NaN, or a constant; ErrNonFiniteFunction: NaN in a search;
+// ErrBadCoefficients: NaN, or a constant; ErrNonFiniteFunction: NaN in a search;
 // ErrIterationLimit; ErrOutOfMemory.
-ErrorCode CxPolynomialRoots(const CDB *coef, int32_t n, int32_t maxIterations, CDB *roots,
+ErrorCode CxPolynomialRoots(ConstComplexVector coef, int32_t maxIterations, ComplexVector roots,
                             int32_t *rootCount);
 
 // c + b x + a x^2 = 0 with a and c other than 0.

@@ -17,9 +17,9 @@ class MatrixPolynomial {
     typedef ElementOf<E> T;
 
 public:
-    MatrixPolynomial(const T *p, int32_t n, const T *a, int32_t order)
-        : p_(p), a_(a), order_(order), elements_(std::ptrdiff_t{order} * order),
-          degree_(std::max(0, LengthWithoutZeros(p, n) - 1)) {}
+    MatrixPolynomial(ConstVectorView<E> p, ConstMatrixView<E> a)
+        : p_(p), a_(a.data()), order_(a.rows()), elements_(a.count()),
+          degree_(std::max(0, LengthWithoutZeros<E>(p) - 1)) {}
 
     ErrorCode evaluate(T *y) {
         chooseBlocks();
@@ -64,7 +64,7 @@ private:
             y[i * order_ + i] = y[i * order_ + i] + p_[k];
     }
 
-    const T *p_;
+    const ConstVectorView<E> p_;
     const T *a_;
     int32_t order_;
     std::ptrdiff_t elements_;
@@ -74,11 +74,13 @@ private:
 
 } // namespace
 
-ErrorCode EvaluateAtMatrix(const DBL *p, int32_t n, const DBL *a, int32_t order, DBL *y) {
-    return MatrixPolynomial<ElementType::DBL>(p, n, a, order).evaluate(y);
+template <ElementType E>
+ErrorCode EvaluateAtMatrix(ConstVectorView<E> p, ConstMatrixView<E> a, MatrixView<E> y) {
+    QX_EXPECTS(a.isSquare() && a.isWhole() && y.count() == a.count() && y.isWhole());
+    return MatrixPolynomial<E>(p, a).evaluate(y.data());
 }
-ErrorCode EvaluateAtMatrix(const CDB *p, int32_t n, const CDB *a, int32_t order, CDB *y) {
-    return MatrixPolynomial<ElementType::CDB>(p, n, a, order).evaluate(y);
-}
+
+template ErrorCode EvaluateAtMatrix(ConstRealVector, ConstRealMatrix, RealMatrix);
+template ErrorCode EvaluateAtMatrix(ConstComplexVector, ConstComplexMatrix, ComplexMatrix);
 
 } // namespace qx

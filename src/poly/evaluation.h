@@ -1,6 +1,7 @@
 #ifndef QX_POLY_EVALUATION_H
 #define QX_POLY_EVALUATION_H
 
+#include "frame/views.h"
 #include "frame/widths.h"
 #include "qx/errors.h"
 #include "qx/types.h"
@@ -16,12 +17,12 @@ QX_BY_WIDTH(void, EvaluateReal,
 QX_BY_WIDTH(void, EvaluateComplex,
             (const CDB *p, int32_t n, const CDB *x, std::ptrdiff_t count, CDB *y))
 
-// y = p(a) for a square matrix with `order` rows: blocks of coefficients of powers up to the s-th,
-// and Horner's rule in the s-th power. ErrOutOfMemory.
+// y = p(a) for a square matrix that is whole: blocks of coefficients of powers up to the s-th, and
+// Horner's rule in the s-th power. ErrOutOfMemory.
 // Source: M. S. Paterson and L. J. Stockmeyer, On the number of nonscalar multiplications necessary
 // to evaluate polynomials, 1973.
-ErrorCode EvaluateAtMatrix(const DBL *p, int32_t n, const DBL *a, int32_t order, DBL *y);
-ErrorCode EvaluateAtMatrix(const CDB *p, int32_t n, const CDB *a, int32_t order, CDB *y);
+template <ElementType E>
+ErrorCode EvaluateAtMatrix(ConstVectorView<E> p, ConstMatrixView<E> a, MatrixView<E> y);
 
 } // namespace qx
 

@@ -10,8 +10,6 @@ namespace qx {
 
 namespace {
 
-constexpr auto Complex = ElementType::CDB;
-
 // Equal roots are as good as next to each other: then the second round of each follows Leja's order
 // like the first.
 double LogDistance(CDB a, CDB b) {
@@ -28,29 +26,28 @@ bool IsPair(CDB root) { return root.im != 0.0; }
 class ConjugatePairs {
 public:
     // ErrOutOfMemory; ErrBadCoefficients.
-    ErrorCode collect(const CDB *roots, int32_t n) {
-        if (const ErrorCode failed = factors_.allocate(n))
-            return failed;
-        Scratch<Complex> below;
-        if (const ErrorCode failed = below.allocate(n))
+    ErrorCode collect(ConstComplexVector roots) {
+        ComplexVector below;
+        if (const ErrorCode failed =
+                memory_.take(Sized(factors_, roots.size()), Sized(below, roots.size())))
             return failed;
         int32_t belowCount = 0;
-        for (int32_t i = 0; i < n; ++i) {
-            if (2.0 * std::fabs(roots[i].im) <= allowance(roots[i]))
-                append({roots[i].re, 0.0});
-            else if (roots[i].im < 0.0)
-                below[belowCount++] = Conj(roots[i]);
+        for (const CDB root : roots) {
+            if (2.0 * std::fabs(root.im) <= allowance(root))
+                append({root.re, 0.0});
+            else if (root.im < 0.0)
+                below[belowCount++] = Conj(root);
         }
-        for (int32_t i = 0; i < n; ++i) {
-            if (!(roots[i].im > 0.0) || 2.0 * roots[i].im <= allowance(roots[i]))
+        for (const CDB root : roots) {
+            if (!(root.im > 0.0) || 2.0 * root.im <= allowance(root))
                 continue;
-            const int32_t partner = nearest(below.data(), belowCount, roots[i]);
+            const int32_t partner = nearest(below.part(0, belowCount), root);
             if (partner < 0)
                 return ErrBadCoefficients;
-            append(roots[i] * 0.5 + below[partner] * 0.5);
+            append(root * 0.5 + below[partner] * 0.5);
             below[partner] = below[--belowCount];
         }
-        return belowCount == 0 ? below.release() : ErrBadCoefficients;
+        return belowCount == 0 ? 0 : ErrBadCoefficients;
     }
     int32_t count() const { return count_; }
     CDB operator[](int32_t i) const { return factors_[i]; }
@@ -58,10 +55,10 @@ public:
 private:
     static double allowance(CDB root) { return 1e-10 * ScaledHypot(root); }
     void append(CDB root) { factors_[count_++] = root; }
-    static int32_t nearest(const CDB *others, int32_t count, CDB root) {
+    static int32_t nearest(ComplexVector others, CDB root) {
         int32_t best = -1;
         double least = kInfinity;
-        for (int32_t j = 0; j < count; ++j) {
+        for (int32_t j = 0; j < others.size(); ++j) {
             const double distance = ScaledHypot(others[j] - root);
             if (distance <= allowance(root) && distance < least) {
                 best = j;
@@ -71,7 +68,8 @@ private:
         return best;
     }
 
-    Scratch<Complex> factors_;
+    ComplexVector factors_;
+    ScratchParts memory_;
     int32_t count_ = 0;
 };
 
@@ -93,15 +91,16 @@ void MultiplyByReal(DBL *a, int32_t degree, CDB root) {
 
 } // namespace
 
-ErrorCode FromRoots(const CDB *roots, int32_t n, DBL *p) {
+ErrorCode FromRoots(ConstComplexVector roots, RealVector p) {
+    QX_EXPECTS(p.size() == roots.size() + 1);
     ConjugatePairs factors;
-    if (const ErrorCode failed = factors.collect(roots, n))
+    if (const ErrorCode failed = factors.collect(roots))
         return failed;
-    Scratch<ElementType::I32> order;
-    if (const ErrorCode failed = order.allocate(factors.count()))
-        return failed;
-    Scratch<ElementType::DBL> sums;
-    if (const ErrorCode failed = sums.allocate(factors.count()))
+    I32 *order;
+    DBL *sums;
+    ScratchParts memory;
+    if (const ErrorCode failed =
+            memory.take(Sized(order, factors.count()), Sized(sums, factors.count())))
         return failed;
     LejaOrder(
         factors.count(), [&](int32_t j) { return LogSize(factors[j]); },
@@ -110,35 +109,35 @@ ErrorCode FromRoots(const CDB *roots, int32_t n, DBL *p) {
             return IsPair(factors[i]) ? distance + LogDistance(factors[j], Conj(factors[i]))
                                       : distance;
         },
-        order.data(), sums.data());
+        order, sums);
     p[0] = 1.0;
     int32_t degree = 0;
     for (int32_t i = 0; i < factors.count(); ++i) {
         const CDB root = factors[order[i]];
-        MultiplyByReal(p, degree, root);
+        MultiplyByReal(p.data(), degree, root);
         degree += IsPair(root) ? 2 : 1;
     }
-    Reverse(p, std::ptrdiff_t{n} + 1);
-    return Merge(order.release(), sums.release());
+    Reverse(p.data(), p.size());
+    return 0;
 }
 
-ErrorCode FromRoots(const CDB *roots, int32_t n, CDB *p) {
-    Scratch<ElementType::I32> order;
-    if (const ErrorCode failed = order.allocate(n))
-        return failed;
-    Scratch<ElementType::DBL> sums;
-    if (const ErrorCode failed = sums.allocate(n))
+ErrorCode FromRoots(ConstComplexVector roots, ComplexVector p) {
+    QX_EXPECTS(p.size() == roots.size() + 1);
+    const auto n = static_cast<int32_t>(roots.size());
+    I32 *order;
+    DBL *sums;
+    ScratchParts memory;
+    if (const ErrorCode failed = memory.take(Sized(order, n), Sized(sums, n)))
         return failed;
     LejaOrder(
         n, [roots](int32_t j) { return LogSize(roots[j]); },
-        [roots](int32_t j, int32_t i) { return LogDistance(roots[j], roots[i]); }, order.data(),
-        sums.data());
-    GrowingProduct product(p);
+        [roots](int32_t j, int32_t i) { return LogDistance(roots[j], roots[i]); }, order, sums);
+    GrowingProduct product(p.data());
     for (int32_t i = 0; i < n; ++i)
         product.multiply(roots[order[i]]);
     for (std::ptrdiff_t i = 0, j = n; i < j; ++i, --j)
         Swap(&p[i], &p[j]);
-    return Merge(order.release(), sums.release());
+    return 0;
 }
 
 } // namespace qx

@@ -11,37 +11,32 @@
 namespace qx {
 namespace {
 
-// The roots as they come along. `refined` follows `simple` where it is not refined.
-struct RootRecords {
-    CDB *refined, *simple;
-    I32 *multiplicity;
-    int32_t count;
+void Append(MultipleRoots &roots, CDB root, int32_t times) {
+    roots.refined[roots.count] = roots.simple[roots.count] = root;
+    roots.multiplicity[roots.count] = times;
+    ++roots.count;
+}
 
-    void append(CDB root, int32_t times) {
-        refined[count] = simple[count] = root;
-        multiplicity[count] = times;
-        ++count;
+int32_t DegreeOf(const MultipleRoots &roots) {
+    int64_t sum = 0;
+    for (int32_t i = 0; i < roots.count; ++i)
+        sum += roots.multiplicity[i];
+    return static_cast<int32_t>(sum);
+}
+
+void Scale(MultipleRoots &roots, double factor) {
+    for (int32_t i = 0; i < roots.count; ++i) {
+        roots.simple[i] = roots.simple[i] * factor;
+        roots.refined[i] = roots.refined[i] * factor;
     }
-    int32_t degree() const {
-        int64_t sum = 0;
-        for (int32_t i = 0; i < count; ++i)
-            sum += multiplicity[i];
-        return static_cast<int32_t>(sum);
-    }
-    void scale(double factor) {
-        for (int32_t i = 0; i < count; ++i) {
-            simple[i] = simple[i] * factor;
-            refined[i] = refined[i] * factor;
-        }
-    }
-};
+}
 
 bool ComesBefore(int32_t timesA, CDB a, int32_t timesB, CDB b) {
     return timesA != timesB ? timesA < timesB : ScaledHypot(a) > ScaledHypot(b);
 }
 
 // By rising multiplicity and falling modulus; equal ones keep their order.
-void SortRecords(RootRecords &roots) {
+void Sort(MultipleRoots &roots) {
     for (int32_t i = 1; i < roots.count; ++i) {
         const CDB root = roots.simple[i];
         const int32_t times = roots.multiplicity[i];
@@ -97,8 +92,8 @@ private:
 };
 
 // What is told apart is told by the bits.
-ErrorCode TakeEigenvalues(const CDB *p, int32_t degree, RootRecords &roots) {
-    CDB *const values = roots.simple; // read ahead of what is written
+ErrorCode TakeEigenvalues(const CDB *p, int32_t degree, MultipleRoots &roots) {
+    CDB *const values = roots.simple.data(); // read ahead of what is written
     if (const ErrorCode failed = CompanionRoots(p, degree, values))
         return failed;
     roots.count = 0;
@@ -111,21 +106,22 @@ ErrorCode TakeEigenvalues(const CDB *p, int32_t degree, RootRecords &roots) {
         if (same < roots.count)
             ++roots.multiplicity[same];
         else
-            roots.append(value, 1);
+            Append(roots, value, 1);
     }
     return 0;
 }
 
 // ErrIterationLimit where the steps do not converge.
-ErrorCode Refine(const CDB *p, int32_t degree, double tolerance, RootRecords &roots) {
-    SortRecords(roots);
+ErrorCode Refine(const CDB *p, int32_t degree, double tolerance, MultipleRoots &roots) {
+    Sort(roots);
     for (int32_t i = 0; i < roots.count; ++i)
         roots.refined[i] = roots.simple[i];
-    return PejorativeRefine(p, degree, tolerance, roots.refined, roots.multiplicity, roots.count);
+    return PejorativeRefine(p, degree, tolerance, roots.refined.data(), roots.multiplicity.data(),
+                            roots.count);
 }
 
 // Real roots stay real where the refinement moved them off the axis by rounding errors alone.
-void DropRoundingErrors(int32_t degree, RootRecords &roots) {
+void DropRoundingErrors(int32_t degree, MultipleRoots &roots) {
     for (int32_t i = 0; i < roots.count; ++i)
         if (roots.simple[i].im == 0.0 && std::fabs(roots.refined[i].im) < degree * kEpsilon)
             roots.refined[i].im = 0.0;
@@ -133,15 +129,15 @@ void DropRoundingErrors(int32_t degree, RootRecords &roots) {
 
 // Degree 3 and above, no root at 0.
 ErrorCode FindStructure(const CDB *ascending, int32_t degree, bool refines, double tolerance,
-                        RootRecords &roots) {
+                        MultipleRoots &roots) {
     NormalisedPolynomial normalised;
     if (const ErrorCode failed = normalised.assign(ascending, degree))
         return failed;
     const CDB *const p = normalised.coefficients();
-    if (const ErrorCode failed =
-            GCDRootStructure(p, degree, tolerance, roots.simple, roots.multiplicity, &roots.count))
+    if (const ErrorCode failed = GCDRootStructure(p, degree, tolerance, roots.simple.data(),
+                                                  roots.multiplicity.data(), &roots.count))
         return failed;
-    bool isFound = roots.degree() == degree;
+    bool isFound = DegreeOf(roots) == degree;
     if (isFound && refines) {
         const ErrorCode status = Refine(p, degree, tolerance, roots);
         if (status != 0 && status != ErrIterationLimit)
@@ -154,36 +150,34 @@ ErrorCode FindStructure(const CDB *ascending, int32_t degree, bool refines, doub
     if (!isFound)
         if (const ErrorCode failed = TakeEigenvalues(p, degree, roots))
             return failed;
-    roots.scale(normalised.sigma());
+    Scale(roots, normalised.sigma());
     if (isFound && refines)
         DropRoundingErrors(degree, roots);
     return 0;
 }
 
 // kept: a double root of a quadratic is two roots here.
-void SolveDirectly(const CDB *a, int32_t degree, RootRecords &roots) {
+void SolveDirectly(const CDB *a, int32_t degree, MultipleRoots &roots) {
     CDB found[2] = {};
     if (degree == 1)
         found[0] = Quotient(-a[0], a[1]);
     else if (degree == 2)
         CxQuadraticRoots(a[0], a[1], a[2], found);
     for (int32_t i = 0; i < degree; ++i)
-        roots.append(found[i], 1);
+        Append(roots, found[i], 1);
 }
 
 } // namespace
 
-ErrorCode MultipleRootsComplex(const CDB *coef, int32_t n, int32_t refine, double tolerance,
-                               CDB *refined, int32_t *refinedCount, CDB *simple, I32 *multiplicity,
-                               int32_t *simpleCount) {
-    if (n < 1)
-        return ErrEmptyInput;
-    for (int32_t k = 0; k < n; ++k)
-        if (!IsFinite(coef[k]))
+ErrorCode FindMultipleRoots(ConstComplexVector coef, bool refines, double tolerance,
+                            MultipleRoots *roots) {
+    QX_EXPECTS(!coef.isEmpty() && roots->simple.size() >= coef.size());
+    for (const CDB coefficient : coef)
+        if (!IsFinite(coefficient))
             return ErrBadCoefficients;
     if (!(tolerance > 0.0))
         tolerance = 1e-10;
-    int32_t degree = n - 1;
+    auto degree = static_cast<int32_t>(coef.size()) - 1;
     while (degree >= 0 && IsZero(coef[degree]))
         --degree;
     if (degree < 1)
@@ -191,15 +185,15 @@ ErrorCode MultipleRootsComplex(const CDB *coef, int32_t n, int32_t refine, doubl
     int32_t zeros = 0;
     while (IsZero(coef[zeros]))
         ++zeros;
-    RootRecords roots = {refined, simple, multiplicity, 0};
+    const CDB *const rest = &coef[zeros];
+    roots->count = 0;
     if (degree - zeros < 3)
-        SolveDirectly(coef + zeros, degree - zeros, roots);
+        SolveDirectly(rest, degree - zeros, *roots);
     else if (const ErrorCode failed =
-                 FindStructure(coef + zeros, degree - zeros, refine != 0, tolerance, roots))
+                 FindStructure(rest, degree - zeros, refines, tolerance, *roots))
         return failed;
     if (zeros > 0)
-        roots.append({0.0, 0.0}, zeros);
-    *refinedCount = *simpleCount = roots.count;
+        Append(*roots, {0.0, 0.0}, zeros);
     return 0;
 }
 

@@ -12,30 +12,27 @@ namespace qx {
 
 namespace {
 
-constexpr auto Complex = ElementType::CDB;
-
 // The distinct poles and their multiplicities.
 class Poles {
 public:
     ErrorCode find(const DBL *denominator, int32_t n, double tolerance) {
-        Scratch<Complex> work;
-        if (const ErrorCode failed = work.allocate(2 * int64_t{n}))
-            return failed;
-        if (const ErrorCode failed = roots_.allocate(n))
-            return failed;
-        if (const ErrorCode failed = times_.allocate(n))
+        ComplexVector widened;
+        MultipleRoots found;
+        if (const ErrorCode failed =
+                memory_.take(Sized(widened, n), Sized(found.refined, n), Sized(found.simple, n),
+                             Sized(found.multiplicity, n)))
             return failed;
         for (int32_t k = 0; k < n; ++k)
-            work[k] = {denominator[k], 0.0};
-        int32_t simpleCount = 0;
-        if (const ErrorCode failed =
-                MultipleRootsComplex(work.data(), n, 1, tolerance, roots_.data(), &count_,
-                                     work.data() + n, times_.data(), &simpleCount))
+            widened[k] = {denominator[k], 0.0};
+        if (const ErrorCode failed = FindMultipleRoots(widened, true, tolerance, &found))
             return failed == ErrNonFiniteInput ? ErrOverflow : failed;
+        roots_ = found.refined;
+        times_ = found.multiplicity;
+        count_ = found.count;
         joinQuadratic(denominator, n, tolerance);
         joinEqual();
         pairConjugates();
-        return work.release();
+        return 0;
     }
 
     int32_t count() const { return count_; }
@@ -108,9 +105,10 @@ private:
         }
     }
 
-    Scratch<Complex> roots_;
-    Scratch<ElementType::I32> times_;
+    ComplexVector roots_;
+    VectorView<ElementType::I32> times_;
     int32_t count_ = 0;
+    ScratchParts memory_;
 };
 
 // The first terms of a power series in t = x - pole, with an exponent of 2 apart.
@@ -159,18 +157,18 @@ private:
         exponent_ += by;
     }
 
-    Scratch<Complex> a_;
+    Scratch<ElementType::CDB> a_;
     int32_t terms_ = 0, exponent_ = 0;
 };
 
 } // namespace
 
-ErrorCode PolesAndResidues(const DBL *numerator, const DBL *denominator, int32_t n,
-                           double tolerance, CDB *poles, CDB *residues) {
-    if (!(tolerance > 0.0))
-        tolerance = 1e-10;
+ErrorCode PolesAndResidues(ConstRealVector numerator, ConstRealVector denominator, double tolerance,
+                           ComplexVector poles, ComplexVector residues) {
+    const auto n = static_cast<int32_t>(denominator.size());
+    QX_EXPECTS(n > 1 && numerator.size() == n - 1 && tolerance > 0.0);
     Poles found;
-    if (const ErrorCode failed = found.find(denominator, n, tolerance))
+    if (const ErrorCode failed = found.find(denominator.data(), n, tolerance))
         return failed;
     Series series;
     if (const ErrorCode failed = series.allocate(n - 1))
@@ -180,7 +178,7 @@ ErrorCode PolesAndResidues(const DBL *numerator, const DBL *denominator, int32_t
         const CDB pole = found[i];
         // Below the axis the conjugates of what is found above.
         const CDB above = pole.im < 0.0 ? Conj(pole) : pole;
-        series.expand(numerator, n - 1, above, times);
+        series.expand(numerator.data(), n - 1, above, times);
         for (int32_t j = 0; j < found.count(); ++j) {
             const CDB distance = above - found[j];
             const bool isOwn = above.re == found[j].re && above.im == found[j].im;

@@ -66,32 +66,28 @@ public:
           count_(rootCount) {}
 
     ErrorCode allocate() {
-        if (const ErrorCode failed = work_.allocate(2 * (int64_t{degree_} + 1) + count_))
-            return failed;
-        if (const ErrorCode failed = best_.allocate(count_))
-            return failed;
-        if (const ErrorCode failed = order_.allocate(count_))
-            return failed;
-        Scratch<Real> distances;
-        if (const ErrorCode failed = distances.allocate(count_))
+        const int64_t length = int64_t{degree_} + 1;
+        DBL *distances;
+        if (const ErrorCode failed = memory_.take(Sized(powers_, length), Sized(product_, length),
+                                                  Sized(change_, count_), Sized(best_, count_),
+                                                  Sized(order_, count_), Sized(distances, count_)))
             return failed;
         LejaOrder(
             count_, [this](int32_t j) { return std::log(ScaledHypot(roots_[j])); },
             [this](int32_t j, int32_t i) { return std::log(ScaledHypot(roots_[j] - roots_[i])); },
-            order_.data(), distances.data());
-        return Merge(system_.allocate(degree_, count_), distances.release());
+            order_, distances);
+        return system_.allocate(degree_, count_);
     }
 
     // The relative size of the step, or the code with which it failed.
     ErrorCode step(double *size) {
-        CDB *const change = work_.data() + 2 * (std::ptrdiff_t{degree_} + 1);
-        if (const ErrorCode failed = system_.solve(change))
+        if (const ErrorCode failed = system_.solve(change_))
             return failed;
         double ofChange = 0.0, ofRoots = 0.0;
         for (int32_t j = 0; j < count_; ++j) {
             ofRoots += SquaredModulus(roots_[j]);
-            ofChange += SquaredModulus(change[j]);
-            roots_[j] -= change[j];
+            ofChange += SquaredModulus(change_[j]);
+            roots_[j] -= change_[j];
         }
         *size = std::sqrt(ofChange / ofRoots);
         return 0;
@@ -115,20 +111,18 @@ public:
     // root)^(multiplicity - 1), the polynomial is s times all x - root, and its derivative by root
     // j is -multiplicity s times all but the j-th.
     void setUp() {
-        const std::ptrdiff_t length = std::ptrdiff_t{degree_} + 1;
-        CDB *const powers = work_.data(), *const product = powers + length;
-        const GrowingProduct base = multiplyPowers(powers);
+        const GrowingProduct base = multiplyPowers(powers_);
         system_.reset(degree_, count_);
         for (int32_t j = 0; j < count_; ++j) {
-            multiplyAllBut(j, GrowingProduct(product, base));
+            multiplyAllBut(j, GrowingProduct(product_, base));
             for (int32_t i = 0; i < degree_; ++i)
-                system_.at(i, j) = product[i] * -double(multiplicities_[j]);
+                system_.at(i, j) = product_[i] * -double(multiplicities_[j]);
         }
-        multiplyAllBut(count_, GrowingProduct(product, base));
+        multiplyAllBut(count_, GrowingProduct(product_, base));
         error_ = 0.0;
         for (int32_t i = 0; i < degree_; ++i) {
             const double size = Modulus(p_[i + 1]), weight = size > 1.0 ? 1.0 / size : 1.0;
-            system_.right(i) = product[i + 1] - p_[i + 1];
+            system_.right(i) = product_[i + 1] - p_[i + 1];
             const double off = Modulus(system_.right(i)) * weight;
             if (!(off <= error_) && error_ == error_)
                 error_ = off; // NaN stays
@@ -162,8 +156,9 @@ private:
     const I32 *multiplicities_;
     int32_t degree_, count_;
     double error_ = 0.0, leastError_ = kInfinity;
-    Scratch<Complex> work_, best_;
-    Scratch<ElementType::I32> order_;
+    CDB *powers_ = nullptr, *product_ = nullptr, *change_ = nullptr, *best_ = nullptr;
+    I32 *order_ = nullptr;
+    ScratchParts memory_;
     LeastSquaresSystem system_;
 };
 

@@ -57,7 +57,7 @@ Outcome GiveConstant(Out<Handle> &p, ScalarIn<Handle> value) {
 
 template <class Handle>
 int32_t LengthWithoutZerosOf(const In<Handle> &p) {
-    return LengthWithoutZeros(p.data(), LengthOf(p));
+    return LengthWithoutZeros<HandleTraits<Handle>::code>(p.view());
 }
 
 enum class Sign { Plus, Minus };
@@ -88,7 +88,7 @@ Outcome Multiply(In<Handle> p, In<Handle> q, Out<Handle> r) {
         return ErrLengthTooLarge;
     if (const Outcome bad = r.resize(static_cast<int32_t>(length)))
         return bad;
-    PolynomialProduct(p.data(), p.size(), q.data(), q.size(), r.data());
+    PolynomialProduct<HandleTraits<Handle>::code>(p.view(), q.view(), r.view());
     return OverflowIn(r);
 }
 
@@ -106,7 +106,8 @@ Outcome DivideInto(const In<Handle> &p, const In<Handle> &q, int32_t n, Out<Hand
         return GiveConstant(quotient, Number<Handle>(0.0));
     if (const Outcome bad = quotient.resize(m - n + 1))
         return bad;
-    DivideInPlace(work.data(), m, q.data(), n, quotient.data());
+    DivideInPlace<HandleTraits<Handle>::code>({work.data(), m}, q.view().part(0, n),
+                                              quotient.view());
     return 0;
 }
 
@@ -232,25 +233,27 @@ Outcome CommonMultipleOf(In<DBL1D> p, In<DBL1D> q, double tolerance, Out<DBL1D> 
     // Both factors monic, so that the product is.
     const int32_t degree = divisor.cofactorDegree();
     const CDB *const cofactor = divisor.cofactorOfQ();
-    Scratch<ElementType::DBL> work;
-    if (const ErrorCode failed = work.allocate(int64_t{m} + degree + 1))
+    RealVector monic, other;
+    ScratchParts memory;
+    if (const ErrorCode failed = memory.take(Sized(monic, m), Sized(other, int64_t{degree} + 1)))
         return failed;
-    DBL *const monic = work.data(), *const other = monic + m;
     for (std::ptrdiff_t i = 0; i < m; ++i)
         monic[i] = p.data()[i] / p.data()[m - 1];
     for (std::ptrdiff_t i = 0; i <= degree; ++i)
         other[i] = cofactor[degree - i].re / cofactor[0].re;
     if (const Outcome bad = lcm.resize(m + degree))
         return bad;
-    PolynomialProduct(monic, m, other, degree + 1, lcm.data());
-    return Merge(OverflowIn(lcm), work.release());
+    PolynomialProduct<ElementType::DBL>(monic, other, lcm.view());
+    return OverflowIn(lcm);
 }
 
-void Evaluate(const DBL *p, int32_t n, const DBL *x, std::ptrdiff_t count, DBL *y) {
-    EvaluateReal(p, n, x, count, y);
-}
-void Evaluate(const CDB *p, int32_t n, const CDB *x, std::ptrdiff_t count, CDB *y) {
-    EvaluateComplex(p, n, x, count, y);
+template <ElementType E>
+void Evaluate(ConstVectorView<E> p, ConstVectorView<E> x, VectorView<E> y) {
+    const auto n = static_cast<int32_t>(p.size());
+    if constexpr (E == ElementType::DBL)
+        EvaluateReal(p.data(), n, x.data(), x.size(), y.data());
+    else
+        EvaluateComplex(p.data(), n, x.data(), x.size(), y.data());
 }
 
 template <class Handle>
@@ -259,10 +262,9 @@ Outcome EvaluateAtPoints(In<Handle> p, In<Handle> x, Out<Handle> y) {
         return ErrEmptyInput;
     if (!IsAllFinite(p))
         return ErrNonFiniteInput;
-    const int32_t count = LengthOf(x);
-    if (const Outcome bad = y.resize(count))
+    if (const Outcome bad = y.resize(LengthOf(x)))
         return bad;
-    Evaluate(p.data(), p.size(), x.data(), count, y.data());
+    Evaluate<HandleTraits<Handle>::code>(p.view(), x.view(), y.view());
     return 0;
 }
 
@@ -270,6 +272,7 @@ enum MatrixMode : int32_t { EachElement = 0, OfMatrix = 1 };
 
 template <class Handle, class Matrix>
 Outcome EvaluateMatrix(In<Handle> p, In<Matrix> a, int32_t mode, Out<Matrix> y) {
+    constexpr ElementType code = HandleTraits<Handle>::code;
     if (const ErrorCode bad =
             FirstFailed({{p.isEmpty(), ErrEmptyInput},
                          {mode != EachElement && mode != OfMatrix, ErrInvalidSelector},
@@ -282,11 +285,10 @@ Outcome EvaluateMatrix(In<Handle> p, In<Matrix> a, int32_t mode, Out<Matrix> y) 
     if (const Outcome bad = y.resize(a.rows(), a.cols()))
         return bad;
     if (mode == EachElement) {
-        Evaluate(p.data(), p.size(), a.data(), static_cast<std::ptrdiff_t>(ElementsOf(a)),
-                 y.data());
+        Evaluate<code>(p.view(), a.view().elements(), y.view().elements());
         return 0;
     }
-    if (const ErrorCode failed = EvaluateAtMatrix(p.data(), p.size(), a.data(), a.rows(), y.data()))
+    if (const ErrorCode failed = EvaluateAtMatrix<code>(p.view(), a.view(), y.view()))
         return failed;
     return OverflowIn(y);
 }
@@ -302,7 +304,7 @@ Outcome Derivative(In<Handle> p, int32_t order, Out<Handle> q) {
         return GiveConstant(q, Number<Handle>(0.0));
     if (const Outcome bad = q.resize(p.size() - order))
         return bad;
-    Differentiate(p.data(), p.size(), order, q.data());
+    Differentiate<HandleTraits<Handle>::code>(p.view(), order, q.view());
     return OverflowIn(q);
 }
 
@@ -333,7 +335,7 @@ Outcome Composition(In<Handle> p, In<Handle> q, Out<Handle> r) {
         return ErrLengthTooLarge;
     if (const Outcome bad = r.resize(static_cast<int32_t>(length)))
         return bad;
-    if (const ErrorCode failed = Compose(p.data(), p.size(), q.data(), q.size(), r.data()))
+    if (const ErrorCode failed = Compose<HandleTraits<Handle>::code>(p.view(), q.view(), r.view()))
         return failed;
     return OverflowIn(r);
 }
@@ -349,7 +351,7 @@ Outcome ProductOfRoots(In<CDB1D> roots, Out<Handle> p) {
         return ErrLengthTooLarge;
     if (const Outcome bad = p.resize(n + 1))
         return bad;
-    if (const ErrorCode failed = FromRoots(roots.data(), n, p.data()))
+    if (const ErrorCode failed = FromRoots(roots.view(), p.view()))
         return failed;
     return OverflowIn(p);
 }
@@ -372,8 +374,8 @@ Outcome Fractions(In<DBL1D> numerator, In<DBL1D> denominator, double tolerance,
         return bad;
     if (n > 1)
         if (const ErrorCode failed =
-                PolesAndResidues(remainder.data(), denominator.data(), n, ToleranceOr(tolerance),
-                                 poles.data(), residues.data()))
+                PolesAndResidues({remainder.data(), n - 1}, denominator.view().part(0, n),
+                                 ToleranceOr(tolerance), poles.view(), residues.view()))
             return failed;
     return Merge(OverflowIn(polynomial, poles, residues), remainder.release());
 }

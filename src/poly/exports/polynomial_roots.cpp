@@ -4,7 +4,7 @@
 #include "frame/scratch.h"
 #include "poly/complex_roots.h"
 #include "poly/multiple_roots.h"
-#include "poly/polished_roots.h"
+#include "poly/newton_bairstow.h"
 
 namespace qx {
 namespace {
@@ -15,46 +15,35 @@ int32_t CountOf(const In<Handle> &guesses) {
     return guesses.identity() == nullptr || guesses.isEmpty() ? 0 : guesses.size();
 }
 
-struct Limit {
-    int32_t maxIterations;
-    double tolerance;
-};
-
-Outcome PolishRoots(In<DBL1D> coef, In<DBL1D> realGuesses, Limit newton, In<CDB1D> complexGuesses,
-                    Limit bairstow, Out<CDB1D> roots) {
+Outcome PolishRoots(In<DBL1D> coef, In<DBL1D> realGuesses, RootLimits newton,
+                    In<CDB1D> complexGuesses, RootLimits bairstow, Out<CDB1D> roots) {
     if (coef.isEmpty()) {
         roots.empty();
         return WarnEmptyResult;
     }
-    const int32_t n = coef.size();
     const int32_t realCount = CountOf(realGuesses), complexCount = CountOf(complexGuesses);
     if (realCount > INT32_MAX - complexCount)
         return ErrOutOfMemory;
     if (const Outcome bad = roots.resize(realCount + complexCount))
         return bad;
-    Scratch<ElementType::DBL> derivative;
-    if (const ErrorCode failed = derivative.allocate(n))
+    Scratch<ElementType::DBL> memory;
+    if (const ErrorCode failed = memory.allocate(coef.size()))
         return failed;
-    PolyDerivative(coef.data(), n, derivative.data());
-    for (int32_t i = 0; i < realCount; ++i) {
-        DBL root;
-        NewtonRoot(coef.data(), n, realGuesses.data()[i], newton.maxIterations, newton.tolerance,
-                   &root, derivative.data());
-        roots.data()[i] = {root, 0.0};
-    }
+    const RealVector derivative(memory.data(), coef.size() - 1);
+    PolyDerivative(coef.view(), derivative);
+    for (int32_t i = 0; i < realCount; ++i)
+        roots.data()[i] = {NewtonRoot(coef.view(), derivative, realGuesses.data()[i], newton), 0.0};
     if (complexCount == 0)
-        return derivative.release();
-    int32_t count;
-    return Merge(BairstowRoots(coef.data(), n, complexGuesses.data(), complexCount,
-                               bairstow.maxIterations, bairstow.tolerance, roots.data() + realCount,
-                               &count),
-                 derivative.release());
+        return 0;
+    return BairstowRoots(coef.view(), complexGuesses.view(), bairstow,
+                         roots.view().part(realCount, complexCount));
 }
 
 Outcome FindRoots(InOut<CDB1D> coef, int32_t maxIterations) {
+    if (coef.isEmpty())
+        return ErrEmptyInput;
     int32_t count = 0;
-    if (const ErrorCode failed =
-            CxPolynomialRoots(coef.data(), coef.size(), maxIterations, coef.data(), &count))
+    if (const ErrorCode failed = CxPolynomialRoots(coef.view(), maxIterations, coef.view(), &count))
         return failed;
     return coef.resize(count);
 }
@@ -62,8 +51,8 @@ Outcome FindRoots(InOut<CDB1D> coef, int32_t maxIterations) {
 CDB Widened(double x) { return {x, 0.0}; }
 CDB Widened(const CDB &z) { return z; }
 
-template <class Handle>
-Outcome CopyOut(const typename Out<Handle>::T *roots, int32_t count, Out<Handle> &out) {
+template <class Handle, ElementType E>
+Outcome CopyOut(VectorView<E> roots, int32_t count, Out<Handle> &out) {
     if (const Outcome bad = out.resize(count))
         return bad;
     for (std::ptrdiff_t i = 0; i < count; ++i)
@@ -73,31 +62,26 @@ Outcome CopyOut(const typename Out<Handle>::T *roots, int32_t count, Out<Handle>
 
 // kept: a failure empties the coefficients, too.
 template <class Handle>
-Outcome FindMultipleRoots(InOut<Handle> coef, int32_t refine, double tolerance, Out<CDB1D> refined,
-                          Out<CDB1D> simple, Out<I32_1D> multiplicities) {
+Outcome RootsWithMultiplicities(InOut<Handle> coef, int32_t refine, double tolerance,
+                                Out<CDB1D> refined, Out<CDB1D> simple, Out<I32_1D> multiplicities) {
     if (coef.isEmpty())
         return ErrEmptyInput;
-    const std::ptrdiff_t n = coef.size();
-    Scratch<ElementType::CDB> work;
-    if (const ErrorCode failed = work.allocate(3 * int64_t{n}))
-        return failed;
-    Scratch<ElementType::I32> times;
-    if (const ErrorCode failed = times.allocate(n))
+    const int32_t n = coef.size();
+    ComplexVector widened;
+    MultipleRoots roots;
+    ScratchParts memory;
+    if (const ErrorCode failed = memory.take(Sized(widened, n), Sized(roots.refined, n),
+                                             Sized(roots.simple, n), Sized(roots.multiplicity, n)))
         return failed;
     for (std::ptrdiff_t k = 0; k < n; ++k)
-        work[k] = Widened(coef.data()[k]);
-    int32_t refinedCount = 0, simpleCount = 0;
-    if (const ErrorCode failed =
-            MultipleRootsComplex(work.data(), static_cast<int32_t>(n), refine, tolerance, &work[n],
-                                 &refinedCount, &work[2 * n], times.data(), &simpleCount))
+        widened[k] = Widened(coef.data()[k]);
+    if (const ErrorCode failed = FindMultipleRoots(widened, refine != 0, tolerance, &roots))
         return failed;
-    if (const Outcome bad = CopyOut(&work[n], refinedCount, refined))
+    if (const Outcome bad = CopyOut(roots.refined, roots.count, refined))
         return bad;
-    if (const Outcome bad = CopyOut(&work[2 * n], simpleCount, simple))
+    if (const Outcome bad = CopyOut(roots.simple, roots.count, simple))
         return bad;
-    if (const Outcome bad = CopyOut(times.data(), simpleCount, multiplicities))
-        return bad;
-    return Merge(work.release(), times.release());
+    return CopyOut(roots.multiplicity, roots.count, multiplicities);
 }
 
 } // namespace
@@ -111,8 +95,8 @@ ErrorCode PolyRootsNtBst_head(DBL1D coef, DBL1D realGuesses, int32_t newtonMaxIt
                               int32_t bairstowMaxIterations, double bairstowTolerance,
                               CDB1D roots) {
     return Returned(qx::PolishRoots, coef, realGuesses,
-                    qx::Limit{newtonMaxIterations, newtonTolerance}, complexGuesses,
-                    qx::Limit{bairstowMaxIterations, bairstowTolerance}, roots);
+                    qx::RootLimits{newtonMaxIterations, newtonTolerance}, complexGuesses,
+                    qx::RootLimits{bairstowMaxIterations, bairstowTolerance}, roots);
 }
 
 int32_t CxPolyRoots_head(CDB1D coef, const int32_t *maxIterations, ErrorCode *err) {
@@ -121,12 +105,12 @@ int32_t CxPolyRoots_head(CDB1D coef, const int32_t *maxIterations, ErrorCode *er
 
 ErrorCode MultPolyRoots_head(DBL1D coef, int32_t refine, double tolerance, CDB1D refined,
                              CDB1D simple, I32_1D multiplicities) {
-    return Returned(qx::FindMultipleRoots<DBL1D>, coef, refine, tolerance, refined, simple,
+    return Returned(qx::RootsWithMultiplicities<DBL1D>, coef, refine, tolerance, refined, simple,
                     multiplicities);
 }
 
 ErrorCode CxMultPolyRoots_head(CDB1D coef, int32_t refine, double tolerance, CDB1D refined,
                                CDB1D simple, I32_1D multiplicities) {
-    return Returned(qx::FindMultipleRoots<CDB1D>, coef, refine, tolerance, refined, simple,
+    return Returned(qx::RootsWithMultiplicities<CDB1D>, coef, refine, tolerance, refined, simple,
                     multiplicities);
 }

@@ -1,4 +1,4 @@
-#include "poly/polished_roots.h"
+#include "poly/newton_bairstow.h"
 
 #include "frame/scratch.h"
 
@@ -7,26 +7,27 @@
 namespace qx {
 namespace {
 
-double Evaluate(const DBL *coef, int32_t n, double x) {
-    double value = 0.0;
-    PolyEvaluateReal(&x, 1, coef, n, &value);
+// Horner's rule; a polynomial without coefficients is 0.
+double Evaluate(ConstRealVector coef, double x) {
+    double value = coef.isEmpty() ? 0.0 : coef[coef.size() - 1];
+    for (std::ptrdiff_t k = coef.size() - 2; k >= 0; --k)
+        value = value * x + coef[k];
     return value;
 }
 
 // The quadratic factor x^2 - r x - s of a polynomial, and what changes it.
 class QuadraticFactor {
 public:
-    QuadraticFactor(const CDB *guesses)
-        : r_(guesses[0].re + guesses[1].re),
-          s_(-(guesses[0].re * guesses[1].re - guesses[0].im * guesses[1].im)) {
+    QuadraticFactor(CDB first, CDB second)
+        : r_(first.re + second.re), s_(-(first.re * second.re - first.im * second.im)) {
         limitR_ = std::fabs(r_) * 1e12 < std::fabs(s_) ? 1.2 : 0.1;
         limitS_ = std::fabs(r_) * 1e-12 > std::fabs(s_) ? 1.2 : 0.1;
     }
 
-    // b and c have n places each, n at least 4.
-    void refine(const DBL *a, int32_t n, int32_t maxIterations, double tolerance, DBL *b, DBL *c) {
-        for (int32_t left = maxIterations; left > 0; --left) {
-            divide(a, n, b, c);
+    // a has at least 4 coefficients; b and c have as many places.
+    void refine(ConstRealVector a, const RootLimits &limits, RealVector b, RealVector c) {
+        for (int32_t left = limits.iterations; left > 0; --left) {
+            divide(a, b, c);
             double dr = 1.0, ds = 1.0;
             const double determinant = c[2] * c[2] - c[3] * c[1];
             if (determinant != 0.0) {
@@ -39,7 +40,7 @@ public:
                 r_ += dr;
                 s_ += ds;
             }
-            if (!shrinks || (changeR < tolerance && changeS < tolerance))
+            if (!shrinks || (changeR < limits.tolerance && changeS < limits.tolerance))
                 return;
             limitR_ = changeR;
             limitS_ = changeS;
@@ -64,12 +65,13 @@ public:
 private:
     // b becomes the quotient by the factor, with the remainder in its first two places, and c the
     // same for b, which holds the derivatives of the remainder.
-    void divide(const DBL *a, int32_t n, DBL *b, DBL *c) const {
+    void divide(ConstRealVector a, RealVector b, RealVector c) const {
+        const std::ptrdiff_t n = a.size();
         b[n - 1] = a[n - 1];
         b[n - 2] = a[n - 2] + r_ * b[n - 1];
         c[n - 1] = b[n - 1];
         c[n - 2] = b[n - 2] + r_ * c[n - 1];
-        for (int32_t j = n - 3; j >= 0; --j) {
+        for (std::ptrdiff_t j = n - 3; j >= 0; --j) {
             b[j] = a[j] + r_ * b[j + 1] + s_ * b[j + 2];
             c[j] = b[j] + r_ * c[j + 1] + s_ * c[j + 2];
         }
@@ -85,41 +87,29 @@ private:
 
 } // namespace
 
-void PolyEvaluateReal(const DBL *x, int32_t count, const DBL *coef, int32_t n, DBL *out) {
-    for (int32_t i = 0; i < count; ++i) {
-        double value = n > 0 ? coef[n - 1] : 0.0;
-        for (int32_t k = n - 2; k >= 0; --k)
-            value = value * x[i] + coef[k];
-        out[i] = value;
-    }
-}
-
-void PolyDerivative(const DBL *coef, int32_t n, DBL *derivative) {
-    for (int32_t k = 1; k < n; ++k)
+void PolyDerivative(ConstRealVector coef, RealVector derivative) {
+    for (int32_t k = 1; k < coef.size(); ++k)
         derivative[k - 1] = k * coef[k];
 }
 
-void NewtonRoot(const DBL *coef, int32_t n, double guess, int32_t maxIterations, double tolerance,
-                DBL *root, const DBL *derivative) {
+double NewtonRoot(ConstRealVector coef, ConstRealVector derivative, double guess,
+                  const RootLimits &limits) {
     constexpr int32_t stallLimit = 5;
-    *root = guess;
-    double x = guess, best = 1e30;
-    double value = Evaluate(coef, n, x);
+    double root = guess, x = guess, best = 1e30;
+    double value = Evaluate(coef, x);
     if (value == 0.0)
-        return;
-    double slope = Evaluate(derivative, n - 1, x);
+        return root;
+    double slope = Evaluate(derivative, x);
     double step = slope != 0.0 ? value / slope : 1.0;
     double size = std::fabs(step);
     int32_t stalled = 0;
-    for (int32_t left = maxIterations; left > 0; --left) {
-        value = Evaluate(coef, n, x);
-        if (value == 0.0) {
-            *root = x;
-            return;
-        }
-        slope = Evaluate(derivative, n - 1, x);
+    for (int32_t left = limits.iterations; left > 0; --left) {
+        value = Evaluate(coef, x);
+        if (value == 0.0)
+            return x;
+        slope = Evaluate(derivative, x);
         if (best > std::fabs(value)) {
-            *root = x;
+            root = x;
             best = std::fabs(value);
             stalled = 0;
         }
@@ -128,44 +118,45 @@ void NewtonRoot(const DBL *coef, int32_t n, double guess, int32_t maxIterations,
             step = value / slope;
             size = std::fabs(step);
         }
-        if (x != 0.0 && (size / std::fabs(x) < tolerance || stalled == stallLimit))
-            return;
+        if (x != 0.0 && (size / std::fabs(x) < limits.tolerance || stalled == stallLimit))
+            return root;
         x -= step;
         ++stalled;
     }
+    return root;
 }
 
-ErrorCode BairstowRoots(const DBL *coef, int32_t n, const CDB *guesses, int32_t guessCount,
-                        int32_t maxIterations, double tolerance, CDB *roots, int32_t *rootCount) {
-    *rootCount = guessCount;
-    if (n < 4 || guessCount < 2) {
-        for (int32_t i = 0; i < guessCount; ++i)
+ErrorCode BairstowRoots(ConstRealVector coef, ConstComplexVector guesses, const RootLimits &limits,
+                        ComplexVector roots) {
+    const std::ptrdiff_t n = coef.size(), count = guesses.size();
+    QX_EXPECTS(roots.size() == count);
+    if (n < 4 || count < 2) {
+        for (std::ptrdiff_t i = 0; i < count; ++i)
             roots[i] = guesses[i];
         return 0;
     }
-    Scratch<ElementType::DBL> work;
-    if (const ErrorCode failed = work.allocate(2 * int64_t{n}))
-        return failed;
-    Scratch<ElementType::CDB> pairs;
-    if (const ErrorCode failed = pairs.allocate(guessCount))
+    RealVector b, c;
+    ComplexVector pairs;
+    ScratchParts memory;
+    if (const ErrorCode failed = memory.take(Sized(b, n), Sized(c, n), Sized(pairs, count)))
         return failed;
     // Real pairs go straight to the output and conjugate ones wait for their place behind them.
-    int32_t realCount = 0, complexCount = 0;
-    for (int32_t i = 0; i + 1 < guessCount; i += 2) {
-        QuadraticFactor factor(guesses + i);
-        factor.refine(coef, n, maxIterations, tolerance, work.data(), work.data() + n);
+    std::ptrdiff_t realCount = 0, complexCount = 0;
+    for (std::ptrdiff_t i = 0; i + 1 < count; i += 2) {
+        QuadraticFactor factor(guesses[i], guesses[i + 1]);
+        factor.refine(coef, limits, b, c);
         CDB solved[2];
         const bool isReal = factor.solve(solved);
-        CDB *const to = isReal ? roots + realCount : pairs.data() + complexCount;
+        CDB *const to = isReal ? &roots[realCount] : &pairs[complexCount];
         to[0] = solved[0];
         to[1] = solved[1];
         (isReal ? realCount : complexCount) += 2;
     }
-    for (int32_t i = 0; i < complexCount; ++i)
+    for (std::ptrdiff_t i = 0; i < complexCount; ++i)
         roots[realCount + i] = pairs[i];
-    if (guessCount % 2 != 0)
-        roots[guessCount - 1] = guesses[guessCount - 1];
-    return Merge(work.release(), pairs.release());
+    if (count % 2 != 0)
+        roots[count - 1] = guesses[count - 1];
+    return 0;
 }
 
 } // namespace qx
