@@ -98,7 +98,7 @@ void Sort() {
     CompareOnAllKinds(
         "sort", "std::sort on a copy",
         [](const double *x, int32_t n, double *work) {
-            qx::SortAscending(x, n, 0, work);
+            qx::SortNaNsFirst({x, n}, qx::SortOrder::Ascending, {work, n});
             Keep(work[0]);
         },
         [](const double *x, int32_t n, double *work) {
@@ -114,7 +114,7 @@ void Median() {
         "median", "std::nth_element on a copy",
         [](const double *x, int32_t n, double *) {
             double median;
-            qx::ArrayMedian(x, n, &median);
+            qx::ArrayMedian({x, n}, &median);
             Keep(median);
         },
         [](const double *x, int32_t n, double *) {
@@ -151,15 +151,15 @@ void Sums() {
         const auto times =
             LeastTimes([&] { AdditionChain(n, 1.25); },
                        [&] {
-                           qx::ArrayMean(x.next(turn), n, &result);
+                           qx::ArrayMean({x.next(turn), n}, &result);
                            Keep(result);
                        },
                        [&] {
-                           qx::ArrayRMS(x.next(turn), n, &result);
+                           qx::ArrayRMS({x.next(turn), n}, &result);
                            Keep(result);
                        },
                        [&] {
-                           qx::ArrayMSE(x.next(turn), n, y.next(otherTurn), n, &result);
+                           qx::ArrayMSE({x.next(turn), n}, {y.next(otherTurn), n}, &result);
                            Keep(result);
                        });
         std::printf("sums n %9d  limit %6.3f ns a term; ratios: mean %5.3f  RMS %5.3f  MSE %5.3f\n",

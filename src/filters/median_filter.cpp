@@ -29,8 +29,7 @@ bool HasNaN(ConstRealVector x) {
 void SortWindow(const DBL *values, std::ptrdiff_t step, std::ptrdiff_t width, DBL *sorted) {
     for (std::ptrdiff_t k = 0; k < width; ++k)
         sorted[k] = values[k * step];
-    // In place it needs no memory, and the width is no less than 1.
-    SortAscending(sorted, static_cast<int32_t>(width), 0, sorted);
+    SortNaNsFirst({sorted, width}, SortOrder::Ascending, {sorted, width});
     DBL *zero = sorted;
     while (zero < sorted + width && !(*zero >= 0.0))
         ++zero;

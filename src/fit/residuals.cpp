@@ -13,7 +13,7 @@ ErrorCode GoodnessOfFit(ConstRealVector y, ConstRealVector fit, ConstRealVector 
     if (n <= dof)
         return ErrTooFewForParameters;
     double mean;
-    ArrayMean(y.data(), n, &mean);
+    ArrayMean(y, &mean);
     double residuals = 0.0, total = 0.0;
     for (int32_t i = 0; i < n; ++i) {
         const double residual = y[i] * y[i] + (fit[i] - 2.0 * y[i]) * fit[i];

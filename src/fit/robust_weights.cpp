@@ -13,10 +13,6 @@ double WeightOr1(ConstRealVector w, std::ptrdiff_t i) {
     return w.isEmpty() ? 1.0 : std::fabs(w[i]);
 }
 
-ErrorCode Median(ConstRealVector x, double *median) {
-    return ArrayMedian(x.data(), static_cast<int32_t>(x.size()), median);
-}
-
 // The distances of the adjusted residuals from their median, or from 0 where that is farther off
 // than any of them. *scale is their median, or their mean where that is 0.
 ErrorCode ScaleOfResiduals(ConstRealVector residuals, ConstRealVector factors, RealVector distances,
@@ -25,7 +21,7 @@ ErrorCode ScaleOfResiduals(ConstRealVector residuals, ConstRealVector factors, R
     for (std::ptrdiff_t i = 0; i < n; ++i)
         distances[i] = residuals[i] * factors[i];
     double middle, largest = 0.0;
-    if (const ErrorCode failed = Median(distances, &middle))
+    if (const ErrorCode failed = ArrayMedian(distances, &middle))
         return failed;
     for (DBL &distance : distances) {
         distance = std::fabs(distance - middle);
@@ -33,9 +29,9 @@ ErrorCode ScaleOfResiduals(ConstRealVector residuals, ConstRealVector factors, R
     }
     for (std::ptrdiff_t i = 0; largest <= std::fabs(middle) && i < n; ++i)
         distances[i] = std::fabs(residuals[i] * factors[i]);
-    if (const ErrorCode failed = Median(distances, scale))
+    if (const ErrorCode failed = ArrayMedian(distances, scale))
         return failed;
-    return *scale == 0.0 ? ArrayMean(distances.data(), static_cast<int32_t>(n), scale) : 0;
+    return *scale == 0.0 ? ArrayMean(distances, scale) : 0;
 }
 
 } // namespace
@@ -44,7 +40,7 @@ ErrorCode LeastAbsoluteWeights(ConstRealVector residuals, ConstRealVector w, Rea
     for (std::ptrdiff_t i = 0; i < out.size(); ++i)
         out[i] = std::fabs(residuals[i]);
     double middle;
-    if (const ErrorCode failed = Median(out, &middle))
+    if (const ErrorCode failed = ArrayMedian(out, &middle))
         return failed;
     const double least = middle == 0.0 ? 1e-07 : 0.01 * middle;
     for (std::ptrdiff_t i = 0; i < out.size(); ++i)

@@ -40,21 +40,19 @@ struct Levels {
 };
 
 ErrorCode FindLevels(const FitSamples &samples, Levels *found) {
-    DBL max, min;
-    int32_t maxIndex, minIndex;
-    if (const ErrorCode failed =
-            ArrayMaxMin(samples.y.data(), samples.n(), &max, &maxIndex, &min, &minIndex))
+    Extremes range;
+    if (const ErrorCode failed = ArrayMaxMin(samples.y, &range))
         return failed;
-    if (maxIndex < 0) // all are NaN
+    if (range.maxIndex < 0) // all are NaN
         return ErrNoUsableFit;
     *found = {};
-    found->halfWidth = 0.5 * ((max - min) / levels);
-    found->max = max;
-    found->min = min;
-    found->atMax = samples.x[maxIndex];
-    found->atMin = samples.x[minIndex];
-    return ArrayHistogram(samples.y.data(), samples.n(), min, max, found->counts, found->centres,
-                          levels);
+    found->halfWidth = 0.5 * ((range.max - range.min) / levels);
+    found->max = range.max;
+    found->min = range.min;
+    found->atMax = samples.x[range.maxIndex];
+    found->atMin = samples.x[range.minIndex];
+    return ArrayHistogram(samples.y, range.min, range.max, {found->counts, levels},
+                          {found->centres, levels});
 }
 
 // The outermost level, from below or from above, at which more than a tenth of the samples stay.

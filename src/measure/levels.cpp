@@ -92,12 +92,10 @@ ErrorCode ComputeLevels(const Waveform &waveform, const LevelSearch &search,
         return failed;
     if (search.method < QXLevelsByHistogram || search.method > QXLevelsAutomatic)
         return ErrMeasureTooManyChannels;
-    DBL max, min;
-    int32_t maxIndex, minIndex;
-    if (const ErrorCode failed =
-            ArrayMaxMin(waveform.y, waveform.n, &max, &maxIndex, &min, &minIndex))
+    Extremes extremes;
+    if (const ErrorCode failed = ArrayMaxMin({waveform.y, waveform.n}, &extremes))
         return failed;
-    const double range = max - min;
+    const double max = extremes.max, min = extremes.min, range = max - min;
     // Numbers are needed, and a range of them; peaks alone may coincide.
     const bool isFlatAllowed = search.method == QXLevelsByPeaks;
     if (!(isFlatAllowed ? range >= 0 : range > 0) || range > std::numeric_limits<double>::max())

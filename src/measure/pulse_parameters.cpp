@@ -20,7 +20,8 @@ void FindBaseAndTop(const DBL *y, int32_t n, double min, double max, PulseParame
     DBL centres[pulseBins];
     found->base = min;
     found->top = max;
-    ArrayHistogram(y, n, min, max, counts, centres, pulseBins); // cannot fail: n > 0, min <= max
+    // cannot fail: n > 0, min <= max
+    ArrayHistogram({y, n}, min, max, {counts, pulseBins}, {centres, pulseBins});
     int32_t baseCount = 0, topCount = 0;
     for (int32_t low = 0, high = pulseBins - 1; low <= high; ++low, --high) {
         if (low < high && counts[low] > baseCount) {
@@ -110,10 +111,10 @@ void MeasureTimes(const RisingFirst &y, double base, double amplitude,
 
 ErrorCode MeasureFirstPulse(const DBL *y, int32_t n, PulseParametersFound *found) {
     *found = {};
-    DBL max, min;
-    int32_t maxIndex, minIndex;
-    if (const ErrorCode failed = ArrayMaxMin(y, n, &max, &maxIndex, &min, &minIndex))
+    Extremes extremes;
+    if (const ErrorCode failed = ArrayMaxMin({y, n}, &extremes))
         return failed;
+    const double max = extremes.max, min = extremes.min;
     if (max == min) {
         found->top = found->base = min;
     } else {

@@ -120,7 +120,7 @@ double ToneSearch::noiseOf(const DBL *power, int32_t count) {
     const int32_t taken = count / every;
     for (int32_t k = 0; k < taken; ++k)
         spectrum_[k] = power[std::ptrdiff_t{k} * every];
-    SelectKth(spectrum_.data(), taken, taken / 2);
+    SelectKth({spectrum_.data(), taken}, taken / 2);
     return spectrum_[taken / 2] / medianOfMean;
 }
 

@@ -23,62 +23,67 @@ double Power(double base, int32_t exponent) {
     return power;
 }
 
+template <ElementType E>
+double CountOf(ConstVectorView<E> x) {
+    return static_cast<double>(x.size());
+}
+
 } // namespace
 
-ErrorCode ArrayMean(const DBL *x, int32_t n, DBL *mean) {
-    if (n < 1)
+ErrorCode ArrayMean(ConstRealVector x, DBL *mean) {
+    if (x.isEmpty())
         return ErrEmptyInput;
     double sum = 0.0;
-    for (int32_t i = 0; i < n; ++i)
-        sum += x[i];
-    *mean = sum / n;
+    for (const double v : x)
+        sum += v;
+    *mean = sum / CountOf(x);
     return 0;
 }
 
-ErrorCode ArrayRMS(const DBL *x, int32_t n, DBL *rms) {
-    if (n < 1)
+ErrorCode ArrayRMS(ConstRealVector x, DBL *rms) {
+    if (x.isEmpty())
         return ErrEmptyInput;
     double sum = 0.0;
-    for (int32_t i = 0; i < n; ++i)
-        sum += x[i] * x[i];
-    *rms = std::sqrt(sum / n);
+    for (const double v : x)
+        sum += v * v;
+    *rms = std::sqrt(sum / CountOf(x));
     return 0;
 }
 
-ErrorCode ArrayCxRMS(const CDB *z, int32_t n, DBL *rms) {
-    if (n < 1)
+ErrorCode ArrayCxRMS(ConstComplexVector z, DBL *rms) {
+    if (z.isEmpty())
         return ErrEmptyInput;
     double sum = 0.0;
-    for (int32_t i = 0; i < n; ++i)
+    for (std::ptrdiff_t i = 0; i < z.size(); ++i)
         sum += z[i].im * z[i].im + z[i].re * z[i].re;
-    *rms = std::sqrt(sum / n);
+    *rms = std::sqrt(sum / CountOf(z));
     return 0;
 }
 
-ErrorCode ArrayMSE(const DBL *x, int32_t nx, const DBL *y, int32_t ny, DBL *mse) {
-    const int32_t m = std::min(nx, ny);
+ErrorCode ArrayMSE(ConstRealVector x, ConstRealVector y, DBL *mse) {
+    const std::ptrdiff_t m = std::min(x.size(), y.size());
     if (m < 1)
         return ErrEmptyInput;
     double sum = 0.0;
-    for (int32_t i = 0; i < m; ++i) {
+    for (std::ptrdiff_t i = 0; i < m; ++i) {
         // kept: expanded, not a squared difference
         const double t = y[i] * (y[i] - 2.0 * x[i]);
         sum += x[i] * x[i] + t;
     }
-    *mse = sum / m;
-    return nx == ny ? 0 : WarnLengthsDiffer;
+    *mse = sum / static_cast<double>(m);
+    return x.size() == y.size() ? 0 : WarnLengthsDiffer;
 }
 
-ErrorCode ArrayMoment(const DBL *x, int32_t n, int32_t order, DBL *moment) {
+ErrorCode ArrayMoment(ConstRealVector x, int32_t order, DBL *moment) {
     double mean;
-    if (const ErrorCode status = ArrayMean(x, n, &mean))
+    if (const ErrorCode status = ArrayMean(x, &mean))
         return status;
     if (order < 1)
         return ErrOrderNotPositive;
     double sum = 0.0;
-    for (int32_t i = 0; i < n; ++i)
-        sum += Power(x[i] - mean, order);
-    *moment = sum / n;
+    for (const double v : x)
+        sum += Power(v - mean, order);
+    *moment = sum / CountOf(x);
     return 0;
 }
 

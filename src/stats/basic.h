@@ -1,25 +1,26 @@
 #ifndef QX_STATS_BASIC_H
 #define QX_STATS_BASIC_H
 
+#include "frame/views.h"
 #include "qx/errors.h"
-#include "qx/types.h"
 
 namespace qx {
 
 // One number from one array. Every sum runs from the first element to the last in one double
-// accumulator that starts at 0; NaN and infinity propagate. ErrEmptyInput for n < 1.
+// accumulator that starts at 0; NaN and infinity propagate. n is the number of elements;
+// ErrEmptyInput where there is none.
 
 // sum(x) / n.
-ErrorCode ArrayMean(const DBL *x, int32_t n, DBL *mean);
+ErrorCode ArrayMean(ConstRealVector x, DBL *mean);
 // sqrt(sum(x^2) / n); the squares may overflow.
-ErrorCode ArrayRMS(const DBL *x, int32_t n, DBL *rms);
-// sqrt(sum(im^2 + re^2) / n) over n complex elements.
-ErrorCode ArrayCxRMS(const CDB *z, int32_t n, DBL *rms);
+ErrorCode ArrayRMS(ConstRealVector x, DBL *rms);
+// sqrt(sum(im^2 + re^2) / n) over the complex elements.
+ErrorCode ArrayCxRMS(ConstComplexVector z, DBL *rms);
 // The mean of (x - y)^2 over the shorter length m, as sum(x x + y (y - 2 x)) / m.
 // WarnLengthsDiffer if the lengths differ.
-ErrorCode ArrayMSE(const DBL *x, int32_t nx, const DBL *y, int32_t ny, DBL *mse);
+ErrorCode ArrayMSE(ConstRealVector x, ConstRealVector y, DBL *mse);
 // sum((x - mean)^order) / n. ErrOrderNotPositive after ErrEmptyInput.
-ErrorCode ArrayMoment(const DBL *x, int32_t n, int32_t order, DBL *moment);
+ErrorCode ArrayMoment(ConstRealVector x, int32_t order, DBL *moment);
 
 } // namespace qx
 

@@ -1,7 +1,6 @@
 #include "stats/histogram.h"
 
 #include <cmath>
-#include <cstring>
 
 namespace qx {
 
@@ -14,6 +13,11 @@ double UnitOfRange(double min, double max, int32_t bins) {
     return std::isinf(bins / (max - min)) ? 0x1p512 : 1.0;
 }
 
+void Clear(VectorView<ElementType::I32> counts) {
+    for (I32 &count : counts)
+        count = 0;
+}
+
 } // namespace
 
 // Everything in units in which the range and its reciprocal stay finite.
@@ -24,13 +28,15 @@ EqualBins::EqualBins(double min, double max, int32_t bins)
     perUnit_ = bins / range;
 }
 
-ErrorCode ArrayHistogram(const DBL *x, int32_t n, double min, double max, I32 *counts, DBL *centres,
-                         int32_t bins) {
+ErrorCode ArrayHistogram(ConstRealVector x, double min, double max,
+                         VectorView<ElementType::I32> counts, RealVector centres) {
+    const auto n = static_cast<int32_t>(x.size()), bins = static_cast<int32_t>(counts.size());
+    QX_EXPECTS(centres.size() == bins);
     if (max < min)
         return ErrRangeReversed;
     if (n < 1 || bins < 1)
         return ErrEmptyInput;
-    std::memset(counts, 0, static_cast<std::size_t>(bins) * sizeof(I32));
+    Clear(counts);
     if (max == min) {
         for (int32_t k = 0; k < bins; ++k)
             centres[k] = min;
@@ -65,16 +71,17 @@ int32_t IntervalTest(const PackedInterval &interval, double x) {
     return isBelow ? -1 : 1;
 }
 
-ErrorCode GeneralHistogram(const DBL *x, int32_t n, const PackedInterval *interval,
-                           int32_t intervals, I32 *counts, HistSummary *summary) {
+ErrorCode GeneralHistogram(ConstRealVector x, const PackedInterval *interval,
+                           VectorView<ElementType::I32> counts, HistSummary *summary) {
+    const auto intervals = static_cast<int32_t>(counts.size());
     *summary = {0, 0, 0};
-    if (n < 1)
+    if (x.isEmpty())
         return ErrEmptyInput;
-    std::memset(counts, 0, static_cast<std::size_t>(intervals) * sizeof(I32));
-    for (int32_t i = 0; i < n; ++i) {
+    Clear(counts);
+    for (const double v : x) {
         bool isPlaced = false;
         for (int32_t j = 0; j < intervals; ++j) {
-            const int32_t position = IntervalTest(interval[j], x[i]);
+            const int32_t position = IntervalTest(interval[j], v);
             if (position == 0) {
                 ++counts[j];
                 isPlaced = true;

@@ -33,7 +33,7 @@ bool HasNaN(const DBL *x, int32_t n) {
 
 // Ranks k - 1 and k of a[0..n-1], k at least 1 unless n is 1.
 Middle SelectPair(DBL *a, int32_t n, int32_t k) {
-    SelectKth(a, n, k);
+    SelectKth({a, n}, k);
     double lower = a[0];
     for (int32_t i = 1; i < k; ++i)
         lower = a[i] > lower ? a[i] : lower;
@@ -60,9 +60,9 @@ bool FindByBracket(const DBL *x, int32_t n, DBL *work, Middle *middle) {
     TakeSample(x, n, work, sampleSize);
     // The middle is this near to that of the sample in 99 of 100 random arrays.
     const auto gap = static_cast<int32_t>(1.3 * std::sqrt(double{1} * sampleSize)) + 1;
-    SelectKth(work, sampleSize, sampleSize / 2 + gap);
+    SelectKth({work, sampleSize}, sampleSize / 2 + gap);
     const double high = work[sampleSize / 2 + gap];
-    SelectKth(work, sampleSize / 2 + gap, sampleSize / 2 - gap);
+    SelectKth({work, sampleSize / 2 + gap}, sampleSize / 2 - gap);
     const double low = work[sampleSize / 2 - gap];
 
     int32_t below = 0;
@@ -90,9 +90,9 @@ bool ReadOff(const DBL *x, int32_t n, Middle *middle) {
     const int32_t k = n / 2;
     if (n < 2)
         return false;
-    if (IsAscending(x, n))
+    if (IsAscending({x, n}))
         *middle = {x[k - 1], x[k]};
-    else if (IsDescending(x, n))
+    else if (IsDescending({x, n}))
         *middle = {x[n - k], x[n - 1 - k]};
     else
         return false;
@@ -116,7 +116,9 @@ double MedianOf(const Middle &middle, int32_t n) {
 
 } // namespace
 
-ErrorCode ArrayMedian(const DBL *x, int32_t n, DBL *median) {
+ErrorCode ArrayMedian(ConstRealVector elements, DBL *median) {
+    const DBL *const x = elements.data();
+    const auto n = static_cast<int32_t>(elements.size());
     if (n < 1)
         return ErrEmptyInput;
     if (HasNaN(x, n))

@@ -48,14 +48,15 @@ ErrorCode SingleMode(double value, Values &modes, int32_t *count) {
 
 // Of bins that outnumber the samples by far only those that hold any are kept: their numbers take
 // the place of the samples, and the centres of the fullest that of their numbers.
-ErrorCode SparselyBinnedMode(const DBL *x, int32_t n, const EqualBins &bins, Values &modes,
+ErrorCode SparselyBinnedMode(ConstRealVector x, const EqualBins &bins, Values &modes,
                              int32_t *count) {
+    const auto n = static_cast<int32_t>(x.size());
     if (const ErrorCode failed = modes.allocate(n))
         return failed;
     DBL *const a = modes.data();
     for (int32_t i = 0; i < n; ++i)
         a[i] = bins.of(x[i]);
-    SortAscending(a, n, 0, nullptr);
+    SortNaNsFirst({a, n}, SortOrder::Ascending, {a, n});
     ModeList list = {a, 1, 0};
     for (int32_t i = 0, run; i < n; i += run) {
         const double bin = a[i];
@@ -77,17 +78,17 @@ ErrorCode SparselyBinnedMode(const DBL *x, int32_t n, const EqualBins &bins, Val
 // kept: as many as have centres in a block of memory, although none is taken for them
 constexpr int32_t mostIntervals = std::numeric_limits<int32_t>::max() / int32_t{sizeof(DBL)};
 
-ErrorCode BinnedMode(const DBL *x, int32_t n, int32_t intervals, Values &modes, int32_t *count) {
-    double max, min;
-    int32_t maxIndex, minIndex;
-    if (const ErrorCode failed = ArrayMaxMin(x, n, &max, &maxIndex, &min, &minIndex))
+ErrorCode BinnedMode(ConstRealVector x, int32_t intervals, Values &modes, int32_t *count) {
+    Extremes range;
+    if (const ErrorCode failed = ArrayMaxMin(x, &range))
         return failed;
+    const double max = range.max, min = range.min;
     if (std::fabs(max - min) <= std::fabs(max) * kEpsilon)
         return SingleMode(max, modes, count);
     if (intervals > mostIntervals)
         return ErrOutOfMemory;
-    if (intervals / 8 > n)
-        return SparselyBinnedMode(x, n, EqualBins(min, max, intervals), modes, count);
+    if (intervals / 8 > x.size())
+        return SparselyBinnedMode(x, EqualBins(min, max, intervals), modes, count);
 
     Scratch<ElementType::I32> counts;
     if (const ErrorCode failed = counts.allocate(intervals))
@@ -95,7 +96,8 @@ ErrorCode BinnedMode(const DBL *x, int32_t n, int32_t intervals, Values &modes, 
     if (const ErrorCode failed = modes.allocate(intervals))
         return failed;
     DBL *const centre = modes.data();
-    if (const ErrorCode failed = ArrayHistogram(x, n, min, max, counts.data(), centre, intervals))
+    if (const ErrorCode failed =
+            ArrayHistogram(x, min, max, {counts.data(), intervals}, {centre, intervals}))
         return failed;
     ModeList list = {centre, 0, 0};
     for (int32_t bin = 0; bin < intervals; ++bin)
@@ -103,11 +105,12 @@ ErrorCode BinnedMode(const DBL *x, int32_t n, int32_t intervals, Values &modes, 
     return Merge(KeepModes(list, modes, count), counts.release());
 }
 
-ErrorCode ExactMode(const DBL *x, int32_t n, Values &modes, int32_t *count) {
+ErrorCode ExactMode(ConstRealVector x, Values &modes, int32_t *count) {
+    const auto n = static_cast<int32_t>(x.size());
     if (const ErrorCode failed = modes.allocate(n))
         return failed;
     DBL *const a = modes.data(); // auto would drop the alignment
-    SortAscending(x, n, 0, a);
+    SortNaNsFirst(x, SortOrder::Ascending, {a, n});
     if (std::fabs(a[0] - a[n - 1]) <= std::fabs(a[0]) * kEpsilon)
         return KeepModes({a, n, 1}, modes, count);
     // NaNs stand at the front; each ends its run at once, since it compares false.
@@ -127,13 +130,12 @@ ErrorCode ExactMode(const DBL *x, int32_t n, Values &modes, int32_t *count) {
 
 } // namespace
 
-ErrorCode ArrayMode(const DBL *x, int32_t n, int32_t intervals, Scratch<ElementType::DBL> &modes,
+ErrorCode ArrayMode(ConstRealVector x, int32_t intervals, Scratch<ElementType::DBL> &modes,
                     int32_t *count) {
     *count = 0;
-    if (n <= 1)
-        return n < 1 ? ErrEmptyInput : 0;
-    return intervals > 0 ? BinnedMode(x, n, intervals, modes, count)
-                         : ExactMode(x, n, modes, count);
+    if (x.size() <= 1)
+        return x.isEmpty() ? ErrEmptyInput : 0;
+    return intervals > 0 ? BinnedMode(x, intervals, modes, count) : ExactMode(x, modes, count);
 }
 
 } // namespace qx

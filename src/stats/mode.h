@@ -11,7 +11,7 @@ namespace qx {
 // of so many bins; otherwise the values that occur most often, equal within a relative distance
 // of the machine epsilon. `modes` receives *count values in ascending order; there is none for
 // a single sample, and where nothing occurs twice. ErrEmptyInput, ErrOutOfMemory.
-ErrorCode ArrayMode(const DBL *x, int32_t n, int32_t intervals, Scratch<ElementType::DBL> &modes,
+ErrorCode ArrayMode(ConstRealVector x, int32_t intervals, Scratch<ElementType::DBL> &modes,
                     int32_t *count);
 
 } // namespace qx

@@ -1,18 +1,20 @@
 #include "stats/order.h"
 
+#include "frame/constants.h"
 #include "frame/elements.h"
 #include "stats/sort.h"
 
 #include <cmath>
 #include <cstring>
-#include <limits>
 
 namespace qx {
 
 // Median-of-three partition selection. The two scans need no bound: the pivot itself stops the
 // one that goes down, and the element at r, which is no smaller than the pivot, or a NaN, the one
 // that goes up.
-void SelectKth(DBL *a, int32_t n, int32_t k) {
+void SelectKth(RealVector elements, int32_t k) {
+    DBL *const a = elements.data();
+    const auto n = static_cast<int32_t>(elements.size());
     int32_t l = 0;
     int32_t r = n - 1;
     // Pivots that hardly shorten the range would make the work quadratic, and data that bring
@@ -22,7 +24,7 @@ void SelectKth(DBL *a, int32_t n, int32_t k) {
     while (r > l + 1) {
         workLeft -= r - l;
         if (workLeft < 0) {
-            HeapSort(a + l, std::ptrdiff_t{r} - l + 1);
+            HeapSort(elements.part(l, std::ptrdiff_t{r} - l + 1));
             return;
         }
         const int32_t mid = l + (r - l) / 2;
@@ -53,16 +55,15 @@ void SelectKth(DBL *a, int32_t n, int32_t k) {
         Swap(&a[l], &a[r]);
 }
 
-ErrorCode ArrayMaxMin(const DBL *x, int32_t n, DBL *maxValue, int32_t *maxIndex, DBL *minValue,
-                      int32_t *minIndex) {
+ErrorCode ArrayMaxMin(ConstRealVector x, Extremes *found) {
+    const auto n = static_cast<int32_t>(x.size());
     if (n < 1)
         return ErrEmptyInput;
     int32_t first = 0;
     while (first < n && std::isnan(x[first]))
         ++first;
     if (first == n) {
-        *maxValue = *minValue = std::numeric_limits<double>::quiet_NaN();
-        *maxIndex = *minIndex = -1;
+        *found = {kNaN, kNaN, -1, -1};
         return 0;
     }
     int32_t highest = first;
@@ -73,31 +74,29 @@ ErrorCode ArrayMaxMin(const DBL *x, int32_t n, DBL *maxValue, int32_t *maxIndex,
         else if (x[i] < x[lowest])
             lowest = i;
     }
-    *maxValue = x[highest];
-    *maxIndex = highest;
-    *minValue = x[lowest];
-    *minIndex = lowest;
+    *found = {x[highest], x[lowest], highest, lowest};
     return 0;
 }
 
-ErrorCode SortAscending(const DBL *x, int32_t n, int32_t descending, DBL *out) {
-    DBL *a = out != nullptr ? out : const_cast<DBL *>(x);
+void SortNaNsFirst(ConstRealVector x, SortOrder order, RealVector out) {
+    const std::ptrdiff_t n = x.size();
+    QX_EXPECTS(out.size() == n);
     if (n < 1)
-        return 0;
-    const bool isAscending = IsAscending(x, n);
-    const bool isDescending = !isAscending && IsDescending(x, n);
-    if (a != x)
-        std::memcpy(a, x, static_cast<std::size_t>(n) * sizeof(DBL));
-    int32_t first = 0; // of those that are no NaN
+        return;
+    const bool isAscending = IsAscending(x);
+    const bool isDescending = !isAscending && IsDescending(x);
+    DBL *const a = out.data();
+    if (a != x.data())
+        std::memcpy(a, x.data(), static_cast<std::size_t>(n) * sizeof(DBL));
+    std::ptrdiff_t first = 0; // of those that are no NaN
     if (!isAscending && !isDescending) {
-        for (int32_t i = 0; i < n; ++i)
+        for (std::ptrdiff_t i = 0; i < n; ++i)
             if (std::isnan(a[i]))
                 Swap(&a[i], &a[first++]);
-        SortRange(a + first, n - first);
+        SortRange(out.part(first, n - first));
     }
-    if (isDescending != (descending != 0))
+    if (isDescending != (order == SortOrder::Descending))
         Reverse(a + first, n - first);
-    return 0;
 }
 
 } // namespace qx

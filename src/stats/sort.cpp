@@ -115,7 +115,7 @@ std::ptrdiff_t Partition(DBL *a, std::ptrdiff_t n) {
 void Sort(DBL *a, std::ptrdiff_t n, int badPivotsAllowed) {
     while (n > insertionLimit) {
         if (badPivotsAllowed == 0) {
-            HeapSort(a, n);
+            HeapSort({a, n});
             return;
         }
         ChoosePivot(a, n);
@@ -138,7 +138,9 @@ void Sort(DBL *a, std::ptrdiff_t n, int badPivotsAllowed) {
 
 } // namespace
 
-void HeapSort(DBL *a, std::ptrdiff_t n) {
+void HeapSort(RealVector elements) {
+    DBL *const a = elements.data();
+    const std::ptrdiff_t n = elements.size();
     for (std::ptrdiff_t root = n / 2; root-- > 0;)
         SiftDown(a, root, n);
     for (std::ptrdiff_t last = n; --last > 0;) {
@@ -147,20 +149,22 @@ void HeapSort(DBL *a, std::ptrdiff_t n) {
     }
 }
 
-void SortRange(DBL *a, std::ptrdiff_t n) { Sort(a, n, std::bit_width(static_cast<uint64_t>(n))); }
-
-bool IsAscending(const DBL *a, std::ptrdiff_t n) {
-    for (std::ptrdiff_t i = 1; i < n; ++i)
-        if (!(a[i - 1] <= a[i]))
-            return false;
-    return n > 1 || a[0] == a[0];
+void SortRange(RealVector a) {
+    Sort(a.data(), a.size(), std::bit_width(static_cast<uint64_t>(a.size())));
 }
 
-bool IsDescending(const DBL *a, std::ptrdiff_t n) {
-    for (std::ptrdiff_t i = 1; i < n; ++i)
+bool IsAscending(ConstRealVector a) {
+    for (std::ptrdiff_t i = 1; i < a.size(); ++i)
+        if (!(a[i - 1] <= a[i]))
+            return false;
+    return a.size() > 1 || a[0] == a[0];
+}
+
+bool IsDescending(ConstRealVector a) {
+    for (std::ptrdiff_t i = 1; i < a.size(); ++i)
         if (!(a[i - 1] >= a[i]))
             return false;
-    return n > 1 || a[0] == a[0];
+    return a.size() > 1 || a[0] == a[0];
 }
 
 } // namespace qx

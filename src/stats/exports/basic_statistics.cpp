@@ -6,14 +6,14 @@
 namespace qx {
 namespace {
 
-ErrorCode Mean(In<DBL1D> x, OutDBL mean) { return ArrayMean(x.data(), x.size(), mean.address()); }
-ErrorCode RMS(In<DBL1D> x, OutDBL rms) { return ArrayRMS(x.data(), x.size(), rms.address()); }
-ErrorCode CxRMS(In<CDB1D> z, OutDBL rms) { return ArrayCxRMS(z.data(), z.size(), rms.address()); }
+ErrorCode Mean(In<DBL1D> x, OutDBL mean) { return ArrayMean(x.view(), mean.address()); }
+ErrorCode RMS(In<DBL1D> x, OutDBL rms) { return ArrayRMS(x.view(), rms.address()); }
+ErrorCode CxRMS(In<CDB1D> z, OutDBL rms) { return ArrayCxRMS(z.view(), rms.address()); }
 ErrorCode MSE(In<DBL1D> x, In<DBL1D> y, OutDBL mse) {
-    return ArrayMSE(x.data(), x.size(), y.data(), y.size(), mse.address());
+    return ArrayMSE(x.view(), y.view(), mse.address());
 }
 ErrorCode Moment(In<DBL1D> x, int32_t order, OutDBL moment) {
-    return ArrayMoment(x.data(), x.size(), order, moment.address());
+    return ArrayMoment(x.view(), order, moment.address());
 }
 
 } // namespace

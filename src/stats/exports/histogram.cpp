@@ -20,11 +20,10 @@ Outcome OverOwnRange(In<DBL1D> x, int32_t bins, Out<I32_1D> counts, Out<DBL1D> c
         return bad;
     if (const Outcome bad = centres.resize(bins))
         return bad;
-    double max, min;
-    int32_t maxIndex, minIndex;
-    if (const ErrorCode failed = ArrayMaxMin(x.data(), x.size(), &max, &maxIndex, &min, &minIndex))
+    Extremes range;
+    if (const ErrorCode failed = ArrayMaxMin(x.view(), &range))
         return failed;
-    return ArrayHistogram(x.data(), x.size(), min, max, counts.data(), centres.data(), bins);
+    return ArrayHistogram(x.view(), range.min, range.max, counts.view(), centres.view());
 }
 
 // The host's records without their padding, in scratch memory. They stand at any byte.
@@ -44,17 +43,16 @@ ErrorCode PackIntervals(const In<HistInterval1D> &intervals, ScratchBytes &packe
 
 Outcome InIntervals(In<DBL1D> x, In<HistInterval1D> intervals, Out<I32_1D> counts,
                     OutValue<HistSummary> summary) {
-    const int32_t count = intervals.size();
     if (intervals.hasNegativeSize())
         return ErrSizesDisagree;
-    if (const Outcome bad = counts.resize(count))
+    if (const Outcome bad = counts.resize(intervals.size()))
         return bad;
     ScratchBytes packed;
     if (const ErrorCode failed = PackIntervals(intervals, packed))
         return failed;
     const ErrorCode status =
-        GeneralHistogram(x.data(), x.size(), static_cast<const PackedInterval *>(packed.bytes()),
-                         count, counts.data(), summary.address());
+        GeneralHistogram(x.view(), static_cast<const PackedInterval *>(packed.bytes()),
+                         counts.view(), summary.address());
     return Merge(status, packed.release());
 }
 

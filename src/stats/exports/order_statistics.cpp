@@ -7,14 +7,12 @@
 namespace qx {
 namespace {
 
-ErrorCode Median(In<DBL1D> x, OutDBL median) {
-    return ArrayMedian(x.data(), x.size(), median.address());
-}
+ErrorCode Median(In<DBL1D> x, OutDBL median) { return ArrayMedian(x.view(), median.address()); }
 
 Outcome Mode(In<DBL1D> x, int32_t intervals, Out<DBL1D> modes) {
     Scratch<ElementType::DBL> found;
     int32_t count = 0;
-    if (const ErrorCode failed = ArrayMode(x.data(), x.size(), intervals, found, &count))
+    if (const ErrorCode failed = ArrayMode(x.view(), intervals, found, &count))
         return failed;
     if (count == 0) {
         modes.empty();

@@ -108,9 +108,9 @@ TEST(Histogram, TreatsEdgesConstantsAndNaN) {
     I32 counts[2];
     DBL centres[2];
     const DBL x[] = {-1.0, 0.0, 0.5, 1.0, 2.0, nan, 1e300, -0.25};
-    EXPECT_EQ(qx::ArrayHistogram(x, 0, 1.0, 0.0, counts, centres, 0), ErrRangeReversed);
-    EXPECT_EQ(qx::ArrayHistogram(x, 0, 0.0, 1.0, counts, centres, 2), ErrEmptyInput);
-    EXPECT_EQ(qx::ArrayHistogram(x, 8, 0.0, 1.0, counts, centres, 2), 0);
+    EXPECT_EQ(qx::ArrayHistogram({x, 0}, 1.0, 0.0, {counts, 0}, {centres, 0}), ErrRangeReversed);
+    EXPECT_EQ(qx::ArrayHistogram({x, 0}, 0.0, 1.0, {counts, 2}, {centres, 2}), ErrEmptyInput);
+    EXPECT_EQ(qx::ArrayHistogram({x, 8}, 0.0, 1.0, {counts, 2}, {centres, 2}), 0);
     EXPECT_EQ(counts[0], 1);
     EXPECT_EQ(counts[1], 2) << "what lies outside is dropped";
 }

@@ -56,17 +56,17 @@ TEST(Order, SortingAndSelectionAgreeWithTheLibrarysSort) {
             Values sorted = x;
             std::sort(sorted.begin(), sorted.end());
             Values out(x.size());
-            ASSERT_EQ(qx::SortAscending(x.data(), n, 0, out.data()), 0);
+            qx::SortNaNsFirst({x.data(), n}, qx::SortOrder::Ascending, {out.data(), n});
             ASSERT_EQ(out, sorted);
-            ASSERT_EQ(qx::SortAscending(x.data(), n, 1, out.data()), 0);
+            qx::SortNaNsFirst({x.data(), n}, qx::SortOrder::Descending, {out.data(), n});
             ASSERT_TRUE(std::equal(out.rbegin(), out.rend(), sorted.begin()));
             Values inPlace = x;
-            ASSERT_EQ(qx::SortAscending(inPlace.data(), n, 0, nullptr), 0);
+            qx::SortNaNsFirst({inPlace.data(), n}, qx::SortOrder::Ascending, {inPlace.data(), n});
             ASSERT_EQ(inPlace, sorted);
 
             for (const int k : {0, n / 3, n / 2, n - 1}) {
                 Values a = x;
-                qx::SelectKth(a.data(), n, k);
+                qx::SelectKth({a.data(), n}, k);
                 ASSERT_EQ(a[static_cast<std::size_t>(k)], sorted[static_cast<std::size_t>(k)]);
                 for (int i = 0; i < n; ++i)
                     ASSERT_TRUE(
@@ -76,7 +76,7 @@ TEST(Order, SortingAndSelectionAgreeWithTheLibrarysSort) {
                 ASSERT_EQ(a, sorted) << "an element was lost";
             }
             double median;
-            ASSERT_EQ(qx::ArrayMedian(x.data(), n, &median), 0);
+            ASSERT_EQ(qx::ArrayMedian({x.data(), n}, &median), 0);
             const auto middle = static_cast<std::size_t>(n / 2);
             const double expected =
                 n % 2 != 0 ? sorted[middle] : (sorted[middle - 1] + sorted[middle]) * 0.5;
@@ -87,11 +87,12 @@ TEST(Order, SortingAndSelectionAgreeWithTheLibrarysSort) {
 TEST(Order, NaNsGoToTheFront) {
     const Values x{3.0, nan, -1.0, nan, 2.0};
     Values out(5);
-    for (const int descending : {0, 1}) {
-        qx::SortAscending(x.data(), 5, descending, out.data());
+    for (const qx::SortOrder order : {qx::SortOrder::Ascending, qx::SortOrder::Descending}) {
+        qx::SortNaNsFirst({x.data(), 5}, order, {out.data(), 5});
         EXPECT_TRUE(std::isnan(out[0]) && std::isnan(out[1]));
-        EXPECT_EQ(Values(out.begin() + 2, out.end()),
-                  descending != 0 ? (Values{3.0, 2.0, -1.0}) : (Values{-1.0, 2.0, 3.0}));
+        EXPECT_EQ(Values(out.begin() + 2, out.end()), order == qx::SortOrder::Descending
+                                                          ? (Values{3.0, 2.0, -1.0})
+                                                          : (Values{-1.0, 2.0, 3.0}));
     }
     // Selection is not meant for NaN, but stays within its array.
     for (int n = 1; n < 40; ++n)
@@ -99,7 +100,7 @@ TEST(Order, NaNsGoToTheFront) {
             DBLArray a(n);
             for (int i = 0; i < n; ++i)
                 a.data()[i] = (pattern * 2654435761U >> (i % 31)) % 2 != 0 ? nan : i * 7 % 11;
-            qx::SelectKth(a.data(), n, n / 2);
+            qx::SelectKth({a.data(), n}, n / 2);
         }
     qx::test::CheckBlocks();
 }
@@ -179,7 +180,7 @@ TEST(Order, NoDataMakeTheWorkQuadratic) {
     arrays.push_back(adversary.values());
     for (const Values &x : arrays) {
         Values a = x;
-        qx::SelectKth(a.data(), n, n / 2);
+        qx::SelectKth({a.data(), n}, n / 2);
         Values sorted = x;
         std::sort(sorted.begin(), sorted.end());
         EXPECT_EQ(a[n / 2], sorted[n / 2]);
@@ -196,14 +197,14 @@ TEST(Order, AMedianOfZeroHasTheSignThatSelectionGives) {
     const auto check = [](const Values &x) {
         const auto n = static_cast<int32_t>(x.size());
         Values a = x;
-        qx::SelectKth(a.data(), n, n / 2);
+        qx::SelectKth({a.data(), n}, n / 2);
         double below = a[0];
         for (int i = 1; i < n / 2; ++i)
             below = a[static_cast<std::size_t>(i)] > below ? a[static_cast<std::size_t>(i)] : below;
         const double upper = a[static_cast<std::size_t>(n / 2)];
         const double expected = n % 2 != 0 ? upper : (below + upper) * 0.5;
         double median;
-        ASSERT_EQ(qx::ArrayMedian(x.data(), n, &median), 0);
+        ASSERT_EQ(qx::ArrayMedian({x.data(), n}, &median), 0);
         ASSERT_EQ(std::signbit(median), std::signbit(expected)) << n;
         ASSERT_EQ(median, expected) << n;
     };
@@ -243,10 +244,10 @@ TEST(Order, AMedianOfManyStandsWhereSortingPutsIt) {
         for (const int count : {n, n - 1}) {
             Values values(x.begin(), x.begin() + count);
             double median;
-            ASSERT_EQ(qx::ArrayMedian(values.data(), count, &median), 0);
+            ASSERT_EQ(qx::ArrayMedian({values.data(), count}, &median), 0);
             EXPECT_EQ(median, MedianByTheLibrary(values));
             values[static_cast<std::size_t>(count - count / 7)] = nan;
-            EXPECT_EQ(qx::ArrayMedian(values.data(), count, &median), ErrNaNInData);
+            EXPECT_EQ(qx::ArrayMedian({values.data(), count}, &median), ErrNaNInData);
         }
     // Among so many arrays there are some whose sample just misses the middle, on either side.
     qx::test::Noise noise(11);
@@ -254,7 +255,7 @@ TEST(Order, AMedianOfManyStandsWhereSortingPutsIt) {
         Values x(static_cast<std::size_t>(600 + round % 2));
         std::generate(x.begin(), x.end(), [&] { return noise.symmetric(); });
         double median;
-        ASSERT_EQ(qx::ArrayMedian(x.data(), static_cast<int32_t>(x.size()), &median), 0);
+        ASSERT_EQ(qx::ArrayMedian({x.data(), static_cast<std::ptrdiff_t>(x.size())}, &median), 0);
         ASSERT_EQ(median, MedianByTheLibrary(x)) << round;
     }
 }
@@ -285,13 +286,10 @@ TEST(Order, MedianKeepsItsInputAndRefusesNaN) {
 
 TEST(Order, ExtremesSkipNaNAndTakeTheFirstOfEquals) {
     const auto find = [](const Values &x) {
-        double max, min;
-        int32_t maxIndex, minIndex;
-        EXPECT_EQ(qx::ArrayMaxMin(x.data(), static_cast<int32_t>(x.size()), &max, &maxIndex, &min,
-                                  &minIndex),
-                  0);
-        return std::vector<double>{max, static_cast<double>(maxIndex), min,
-                                   static_cast<double>(minIndex)};
+        qx::Extremes found;
+        EXPECT_EQ(qx::ArrayMaxMin({x.data(), static_cast<std::ptrdiff_t>(x.size())}, &found), 0);
+        return std::vector<double>{found.max, static_cast<double>(found.maxIndex), found.min,
+                                   static_cast<double>(found.minIndex)};
     };
     EXPECT_EQ(find({nan, 2.0, 5.0, -1.0, 5.0, nan, -1.0}), (Values{5.0, 2, -1.0, 3}));
     EXPECT_EQ(find({4.0}), (Values{4.0, 0, 4.0, 0}));
@@ -300,9 +298,8 @@ TEST(Order, ExtremesSkipNaNAndTakeTheFirstOfEquals) {
     EXPECT_TRUE(std::isnan(none[0]) && std::isnan(none[2]));
     EXPECT_EQ(none[1], -1);
     EXPECT_EQ(none[3], -1);
-    double value;
-    int32_t index;
-    EXPECT_EQ(qx::ArrayMaxMin(nullptr, 0, &value, &index, &value, &index), ErrEmptyInput);
+    qx::Extremes unused;
+    EXPECT_EQ(qx::ArrayMaxMin({}, &unused), ErrEmptyInput);
 }
 
 Values ModesOf(const Values &samples, int32_t intervals, ErrorCode expected = 0) {
@@ -355,8 +352,9 @@ TEST(Mode, BinsWithoutSamplesTakeNoMemory) {
                 continue;
             std::vector<I32> counts(static_cast<std::size_t>(intervals));
             std::vector<DBL> centres(counts.size());
-            qx::ArrayHistogram(DBLArray(x).data(), n, *min, *max, counts.data(), centres.data(),
-                               intervals);
+            const DBLArray data(x);
+            qx::ArrayHistogram({data.data(), n}, *min, *max, {counts.data(), intervals},
+                               {centres.data(), intervals});
             const int32_t most = *std::max_element(counts.begin(), counts.end());
             Values expected;
             for (std::size_t k = 0; most > 1 && k < counts.size(); ++k)
