@@ -1,17 +1,15 @@
 #ifndef QX_CALCULUS_DIFFERENTIATION_H
 #define QX_CALCULUS_DIFFERENTIATION_H
 
-#include "qx/errors.h"
-#include "qx/types.h"
+#include "frame/views.h"
 
 namespace qx {
 
 enum DifferentiationRule : int32_t { CentralSecondOrder, CentralFourthOrder, Forward, Backward };
 
-// `out` may be x. The values beyond the data are as many as the rule looks at; pointers that it
-// does not need may be null. ErrInvalidSelector.
-ErrorCode Differentiate(const DBL *x, int32_t n, double dt, const DBL *initial, const DBL *final,
-                        int32_t rule, DBL *out);
+// `out` may be x. The values beyond the data are at least as many as the rule looks at.
+void Differentiate(ConstRealVector x, double dt, ConstRealVector initial, ConstRealVector final,
+                   DifferentiationRule rule, RealVector out);
 
 } // namespace qx
 

@@ -1,8 +1,8 @@
 #ifndef QX_CALCULUS_INTEGRATION_H
 #define QX_CALCULUS_INTEGRATION_H
 
+#include "frame/views.h"
 #include "qx/errors.h"
-#include "qx/types.h"
 
 namespace qx {
 
@@ -19,20 +19,29 @@ enum IntegrationRule : int32_t {
 // the data, or by a formula of the rule's order at its start.
 enum class Remainder { LowerRuleAtEnd, OwnOrderAtStart };
 
-// include/qx/calculus.h tells what they compute and their codes, of which only ErrEmptyInput and
-// ErrSamplingNotPositive are the frames' (the latter RunningIntegral2017's own, too).
-ErrorCode DefiniteIntegral(const DBL *x, int32_t n, double dt, int32_t rule, Remainder remainder,
-                           double *result);
-ErrorCode DefiniteIntegral2D(const DBL *x, int32_t rows, int32_t cols, const DBL *dts,
-                             int32_t dtCount, int32_t rule, Remainder remainder, double *result);
-ErrorCode DefiniteIntegral3D(const DBL *x, const int32_t (&dims)[3], const DBL *dts,
-                             int32_t dtCount, int32_t rule, Remainder remainder, double *result);
+// Elements that a block of three dimensions holds.
+struct Volume {
+    const DBL *data;
+    int32_t rows, cols, planes;
+    ConstRealMatrix plane(int32_t i) const {
+        return {data + std::ptrdiff_t{i} * rows * cols, rows, cols};
+    }
+};
 
-// The running integral, `out` may be x. The values beyond the data are as many as the rule looks
-// at; pointers that it does not need may be null.
-ErrorCode RunningIntegral(const DBL *x, int32_t n, double dt, const DBL *initial, const DBL *final,
-                          DBL *out, int32_t rule);
-ErrorCode RunningIntegral2017(const DBL *x, int32_t n, double dt, DBL *out, int32_t rule);
+// include/qx/calculus.h has what they compute and their codes, of which only ErrEmptyInput and
+// ErrSamplingNotPositive are the frames'.
+ErrorCode DefiniteIntegral(ConstRealVector x, double dt, int32_t rule, Remainder remainder,
+                           double *result);
+ErrorCode DefiniteIntegral2D(ConstRealMatrix x, ConstRealVector dts, int32_t rule,
+                             Remainder remainder, double *result);
+ErrorCode DefiniteIntegral3D(const Volume &x, ConstRealVector dts, int32_t rule,
+                             Remainder remainder, double *result);
+
+// The running integral, `out` may be x. The values beyond the data are at least as many as the rule
+// looks at.
+void RunningIntegral(ConstRealVector x, double dt, ConstRealVector initial, ConstRealVector final,
+                     IntegrationRule rule, RealVector out);
+ErrorCode RunningIntegral2017(ConstRealVector x, double dt, int32_t rule, RealVector out);
 
 } // namespace qx
 

@@ -1,7 +1,7 @@
 #ifndef QX_CALCULUS_NEIGHBOURS_H
 #define QX_CALCULUS_NEIGHBOURS_H
 
-#include "qx/types.h"
+#include "frame/views.h"
 
 namespace qx {
 
@@ -12,8 +12,9 @@ struct Beyond {
 };
 
 // As many as the formula looks at, the others 0: the last of `before` is x[-1].
-inline Beyond ValuesBeyond(const DBL *initial, int32_t initialCount, const DBL *final,
+inline Beyond ValuesBeyond(ConstRealVector initial, int32_t initialCount, ConstRealVector final,
                            int32_t finalCount) {
+    QX_EXPECTS(initial.size() >= initialCount && final.size() >= finalCount);
     Beyond beyond = {};
     for (int32_t i = 0; i < initialCount; ++i)
         beyond.before[2 - initialCount + i] = initial[i];
@@ -25,7 +26,8 @@ inline Beyond ValuesBeyond(const DBL *initial, int32_t initialCount, const DBL *
 // out[i] = formula(x[i-2], x[i-1], x[i], x[i+1], x[i+2]). Reading runs ahead of writing, so `out`
 // may be x.
 template <class Formula>
-void FromNeighbours(const DBL *x, int32_t n, const Beyond &beyond, DBL *out, Formula formula) {
+void FromNeighbours(ConstRealVector x, const Beyond &beyond, RealVector out, Formula formula) {
+    const auto n = static_cast<int32_t>(x.size());
     const auto at = [&](int32_t i) {
         return i < n ? static_cast<double>(x[i]) : beyond.behind[i - n];
     };

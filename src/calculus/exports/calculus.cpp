@@ -11,27 +11,26 @@ template <Remainder Leftover>
 ErrorCode Definite(In<DBL1D> x, double dt, int32_t rule, OutDBL result) {
     if (x.isEmpty())
         return ErrEmptyInput;
-    return DefiniteIntegral(x.data(), x.size(), dt, rule, Leftover, result.address());
+    return DefiniteIntegral(x.view(), dt, rule, Leftover, result.address());
 }
 
 template <Remainder Leftover>
 ErrorCode Definite2D(In<DBL2D> x, In<DBL1D> dts, int32_t rule, OutDBL result) {
-    return DefiniteIntegral2D(x.data(), x.rows(), x.cols(), dts.data(), dts.size(), rule, Leftover,
-                              result.address());
+    return DefiniteIntegral2D(x.view(), dts.view(), rule, Leftover, result.address());
 }
 
 template <Remainder Leftover>
 ErrorCode Definite3D(In<DBL3D> x, In<DBL1D> dts, int32_t rule, OutDBL result) {
-    const int32_t dims[3] = {x.dimension(0), x.dimension(1), x.dimension(2)};
-    return DefiniteIntegral3D(x.data(), dims, dts.data(), dts.size(), rule, Leftover,
-                              result.address());
+    const Volume volume = {x.data(), x.dimension(0), x.dimension(1), x.dimension(2)};
+    return DefiniteIntegral3D(volume, dts.view(), rule, Leftover, result.address());
 }
 
 ErrorCode IntegralBySimpson(InOut<DBL1D> x, const double *initial, const double *final, double dt) {
     if (const ErrorCode bad =
             LastFailed({{dt <= 0.0, ErrSamplingNotPositive}, {x.isEmpty(), ErrEmptyInput}}))
         return bad;
-    return RunningIntegral(x.data(), x.size(), dt, initial, final, x.data(), Simpson);
+    RunningIntegral(x.view(), dt, {initial, 1}, {final, 1}, Simpson, x.view());
+    return 0;
 }
 
 // What a formula needs beyond the data, and how the lack of it is told.
@@ -60,14 +59,16 @@ ErrorCode IntegralByRule(InOut<DBL1D> x, In<DBL1D> initial, In<DBL1D> final, dou
         return bad;
     if (const ErrorCode bad = CheckIntegralEnds(rule, initial.size(), final.size()))
         return bad;
-    return RunningIntegral(x.data(), x.size(), dt, initial.data(), final.data(), x.data(), rule);
+    RunningIntegral(x.view(), dt, initial.view(), final.view(), static_cast<IntegrationRule>(rule),
+                    x.view());
+    return 0;
 }
 
 ErrorCode IntegralFromZero(InOut<DBL1D> x, double dt, int32_t rule) {
     if (const ErrorCode bad =
             FirstFailed({{dt <= 0.0, ErrSamplingNotPositive}, {x.isEmpty(), ErrEmptyInput}}))
         return bad;
-    return RunningIntegral2017(x.data(), x.size(), dt, x.data(), rule);
+    return RunningIntegral2017(x.view(), dt, rule, x.view());
 }
 
 // kept: the checks run in the reverse order of the integral's, and a step that is NaN fails here.
@@ -75,7 +76,8 @@ ErrorCode CentralDerivative(InOut<DBL1D> x, const double *initial, const double 
     if (const ErrorCode bad =
             LastFailed({{x.isEmpty(), ErrEmptyInput}, {!(dt > 0.0), ErrSamplingNotPositive}}))
         return bad;
-    return Differentiate(x.data(), x.size(), dt, initial, final, CentralSecondOrder, x.data());
+    Differentiate(x.view(), dt, {initial, 1}, {final, 1}, CentralSecondOrder, x.view());
+    return 0;
 }
 
 ErrorCode CheckDerivativeEnds(int32_t rule, int32_t initial, int32_t final) {
@@ -100,7 +102,9 @@ ErrorCode DerivativeByRule(InOut<DBL1D> x, In<DBL1D> initial, In<DBL1D> final, d
         return bad;
     if (const ErrorCode bad = CheckDerivativeEnds(rule, initial.size(), final.size()))
         return bad;
-    return Differentiate(x.data(), x.size(), dt, initial.data(), final.data(), rule, x.data());
+    Differentiate(x.view(), dt, initial.view(), final.view(),
+                  static_cast<DifferentiationRule>(rule), x.view());
+    return 0;
 }
 
 constexpr auto AtEnd = Remainder::LowerRuleAtEnd;

@@ -79,79 +79,78 @@ double AtStart(const DBL *x, int32_t rule, int32_t rest, double h) {
     return (27.0 * x[0] + 102.0 * x[1] + 72.0 * x[2] + 42.0 * x[3] - 3.0 * x[4]) * h / 80.0;
 }
 
-ErrorCode CheckLowerRule(int32_t n, int32_t rule) {
-    return FirstFailed({{rule < Trapezoid || rule > Bode, ErrInvalidSelector},
-                        {n < int64_t{rule} + 2, ErrSizesDisagree}});
-}
-
-// kept: here the count is checked first, also against a rule that does not exist.
-ErrorCode CheckOwnOrder(int32_t n, int32_t rule) {
+// kept: with formulas at the start the count is checked first, also against a rule that does not
+// exist.
+ErrorCode CheckSamples(std::ptrdiff_t n, int32_t rule, Remainder remainder) {
+    if (remainder == Remainder::LowerRuleAtEnd)
+        return FirstFailed({{rule < Trapezoid || rule > Bode, ErrInvalidSelector},
+                            {n < int64_t{rule} + 2, ErrSizesDisagree}});
     const bool isRectangle = rule == LeftRectangle || rule == RightRectangle;
     const int64_t least = isRectangle ? 2 : int64_t{rule} + 2;
     return FirstFailed({{n < least, ErrSizesDisagree},
                         {rule < Trapezoid || rule > RightRectangle, ErrInvalidSelector}});
 }
 
+double Integrate(ConstRealVector samples, double dt, int32_t rule, Remainder remainder) {
+    const DBL *const x = samples.data();
+    const auto n = static_cast<int32_t>(samples.size());
+    const double h = std::fabs(dt);
+    if (rule == Trapezoid)
+        return TrapezoidSum(x, n, h);
+    if (rule == LeftRectangle)
+        return h * SumBetween(x, 0, n - 1, 0.0);
+    if (rule == RightRectangle)
+        return h * SumBetween(x, 1, n, 0.0);
+    const int32_t rest = (n - 1) % (rule + 1);
+    return remainder == Remainder::LowerRuleAtEnd
+               ? Panels(x, n, h, rule, 0) + AtEnd(x + n - 1, rest, h)
+               : AtStart(x, rule, rest, h) + Panels(x, n, h, rule, rest);
+}
+
 } // namespace
 
-ErrorCode DefiniteIntegral(const DBL *x, int32_t n, double dt, int32_t rule, Remainder remainder,
+ErrorCode DefiniteIntegral(ConstRealVector x, double dt, int32_t rule, Remainder remainder,
                            double *result) {
-    const bool isAtEnd = remainder == Remainder::LowerRuleAtEnd;
-    if (const ErrorCode bad = isAtEnd ? CheckLowerRule(n, rule) : CheckOwnOrder(n, rule))
+    if (const ErrorCode bad = CheckSamples(x.size(), rule, remainder))
         return bad;
-    const double h = std::fabs(dt);
-    if (rule == Trapezoid) {
-        *result = TrapezoidSum(x, n, h);
-    } else if (rule == LeftRectangle) {
-        *result = h * SumBetween(x, 0, n - 1, 0.0);
-    } else if (rule == RightRectangle) {
-        *result = h * SumBetween(x, 1, n, 0.0);
-    } else {
-        const int32_t rest = (n - 1) % (rule + 1);
-        *result = isAtEnd ? Panels(x, n, h, rule, 0) + AtEnd(x + n - 1, rest, h)
-                          : AtStart(x, rule, rest, h) + Panels(x, n, h, rule, rest);
-    }
+    *result = Integrate(x, dt, rule, remainder);
     return 0;
 }
 
-ErrorCode DefiniteIntegral2D(const DBL *x, int32_t rows, int32_t cols, const DBL *dts,
-                             int32_t dtCount, int32_t rule, Remainder remainder, double *result) {
-    if (const ErrorCode bad = FirstFailed({{rows < 3 || cols < 3, ErrSizesDisagree},
-                                           {dtCount < 2, ErrFewerThanTwo},
+ErrorCode DefiniteIntegral2D(ConstRealMatrix x, ConstRealVector dts, int32_t rule,
+                             Remainder remainder, double *result) {
+    if (const ErrorCode bad = FirstFailed({{x.rows() < 3 || x.cols() < 3, ErrSizesDisagree},
+                                           {dts.size() < 2, ErrFewerThanTwo},
                                            {rule < Trapezoid || rule > Bode, ErrInvalidSelector}}))
         return bad;
     Scratch<ElementType::DBL> ofRows;
-    if (const ErrorCode failed = ofRows.allocate(rows))
+    if (const ErrorCode failed = ofRows.allocate(x.rows()))
         return failed;
-    for (int32_t row = 0; row < rows; ++row) {
-        double integral = 0.0;
-        if (const ErrorCode bad = DefiniteIntegral(x + std::ptrdiff_t{row} * cols, cols, dts[0],
-                                                   rule, remainder, &integral))
-            return bad;
-        ofRows[row] = integral;
-    }
-    return DefiniteIntegral(ofRows.data(), rows, dts[1], rule, remainder, result);
+    if (const ErrorCode bad = CheckSamples(x.cols(), rule, remainder))
+        return bad;
+    for (int32_t row = 0; row < x.rows(); ++row)
+        ofRows[row] = Integrate({x.row(row), x.cols()}, dts[0], rule, remainder);
+    return DefiniteIntegral({ofRows.data(), x.rows()}, dts[1], rule, remainder, result);
 }
 
 // kept: the last dimension counts the planes, whatever its place in the block.
-ErrorCode DefiniteIntegral3D(const DBL *x, const int32_t (&dims)[3], const DBL *dts,
-                             int32_t dtCount, int32_t rule, Remainder remainder, double *result) {
-    const auto &[rows, cols, planes] = dims;
-    if (const ErrorCode bad = FirstFailed({{rows < 3 || cols < 3 || planes < 3, ErrSizesDisagree},
-                                           {dtCount < 3, ErrFewerThanThree},
-                                           {rule < Trapezoid || rule > Bode, ErrInvalidSelector}}))
+ErrorCode DefiniteIntegral3D(const Volume &x, ConstRealVector dts, int32_t rule,
+                             Remainder remainder, double *result) {
+    if (const ErrorCode bad =
+            FirstFailed({{x.rows < 3 || x.cols < 3 || x.planes < 3, ErrSizesDisagree},
+                         {dts.size() < 3, ErrFewerThanThree},
+                         {rule < Trapezoid || rule > Bode, ErrInvalidSelector}}))
         return bad;
     Scratch<ElementType::DBL> ofPlanes;
-    if (const ErrorCode failed = ofPlanes.allocate(planes))
+    if (const ErrorCode failed = ofPlanes.allocate(x.planes))
         return failed;
-    for (int32_t plane = 0; plane < planes; ++plane) {
+    for (int32_t i = 0; i < x.planes; ++i) {
         double integral = 0.0;
-        if (const ErrorCode bad = DefiniteIntegral2D(x + std::ptrdiff_t{plane} * rows * cols, rows,
-                                                     cols, dts, 2, rule, remainder, &integral))
+        if (const ErrorCode bad = DefiniteIntegral2D(x.plane(i), dts, rule, remainder, &integral))
             return bad;
-        ofPlanes[plane] = integral;
+        ofPlanes[i] = integral;
     }
-    return DefiniteIntegral(ofPlanes.data(), planes, dts[2], rule, remainder, result);
+    return DefiniteIntegral({ofPlanes.data(), x.planes}, dts[2], rule, remainder, result);
 }
 
 } // namespace qx
