@@ -619,7 +619,61 @@ TEST(BoundedFits, BisquareBeginsWhereTheBulkOfTheDataLies) {
     }
 }
 
+// Where it ends, the line is that of the biweights that its own residuals and leverages give.
+TEST(BoundedFits, BisquareLinesAllowForLeverage) {
+    Fit f = Sampled(line, {2.5, 1.5}, 0, 5, 12, 0.8, 9);
+    f.x.back() = 30; // nearly all of the leverage, and off the line of the others
+    f.y.back() = 70;
+    f.method = qx::bisquare;
+    const std::size_t n = f.x.size();
+    ASSERT_EQ(f("line").status, 0);
+    double mean = 0, spread = 0;
+    for (const double x : f.x)
+        mean += x / static_cast<double>(n);
+    for (const double x : f.x)
+        spread += (x - mean) * (x - mean);
+    Values adjusted, distances, weights;
+    for (std::size_t i = 0; i < n; ++i) {
+        const double d = f.x[i] - mean, leverage = 1.0 / static_cast<double>(n) + d * d / spread;
+        adjusted.push_back((f.y[i] - line(f.x[i], f.p)) / std::sqrt(1 - leverage));
+    }
+    const auto median = [](Values v) {
+        std::sort(v.begin(), v.end());
+        return (v[(v.size() - 1) / 2] + v[v.size() / 2]) / 2;
+    };
+    for (const double r : adjusted)
+        distances.push_back(std::fabs(r - median(adjusted)));
+    for (const double r : adjusted) {
+        const double q = r * 0.6745 / (4.685 * median(distances));
+        weights.push_back(std::fabs(q) < 1 ? (1 - q * q) * (1 - q * q) : 0.0);
+    }
+    Fit again = {f.x, f.y, weights};
+    again("line");
+    EXPECT_NEAR(f.p[0], again.p[0], 1e-9);
+    EXPECT_NEAR(f.p[1], again.p[1], 1e-9);
+}
+
 // Frames.
+
+TEST(BoundedFits, HaveADefaultTolerance) {
+    for (const uint16_t method : methods)
+        for (const char *const name : {"exponential", "line"}) {
+            if (method == qx::leastSquares && std::string(name) == "line")
+                continue; // takes none
+            std::vector<Fit> fits;
+            for (const double tolerance : {0.0, -1.0, 0.0001, 1e-9}) {
+                fits.push_back(Sampled(exponential, {2, -1, 0.5}, 0, 4, 30, 0.3, 3));
+                fits.back().method = method;
+                fits.back().tolerance = tolerance;
+                fits.back()(name);
+            }
+            for (const std::size_t i : {0U, 1U}) {
+                EXPECT_EQ(fits[i].p, fits[2].p) << name << method;
+                EXPECT_EQ(fits[i].iterations, fits[2].iterations) << name << method;
+            }
+            EXPECT_NE(fits[3].iterations, fits[2].iterations) << name << method;
+        }
+}
 
 TEST(BoundedFits, CheckTheirArguments) {
     const Fit good = Sampled(exponential, {2, -0.8, 1}, 0.5, 4, 20, 0.05, 1);
