@@ -70,6 +70,8 @@ std::vector<double> WorkFor(const Driver &driver) {
     return std::vector<double>(static_cast<std::size_t>(size));
 }
 
+constexpr auto Real = qx::ElementType::DBL;
+
 const std::vector<int32_t> orders = {2, 4, 8, 16, 50, 100, 200, 500};
 
 void SingularValueDecomposition(bool withVectors) {
@@ -89,9 +91,10 @@ void SingularValueDecomposition(bool withVectors) {
             ratios, withVectors ? "svd" : "singular values", n,
             [&] {
                 if (withVectors)
-                    qx::SVDecompose(a.data(), n, n, u.data(), s.data(), v.data(), 0);
+                    qx::SVDecompose<Real>({a.data(), n, n}, {u.data(), n, n}, {s.data(), n},
+                                          {v.data(), n, n});
                 else
-                    qx::SingularValues(a.data(), n, n, s.data());
+                    qx::SingularValues<Real>({a.data(), n, n}, {s.data(), n});
             },
             [&] {
                 copy = a;
@@ -112,7 +115,10 @@ void SymmetricEigenproblem() {
         };
         std::vector<double> work = WorkFor(driver);
         Compare(
-            ratios, "symmetric", n, [&] { qx::SymmetricEigen(a.data(), n, 1, w.data(), v.data()); },
+            ratios, "symmetric", n,
+            [&] {
+                qx::SymmetricEigen<Real>({a.data(), n, n}, {w.data(), n}, {v.data(), n, n});
+            },
             [&] {
                 copy = a;
                 driver(work.data(), static_cast<int32_t>(work.size()));
@@ -135,7 +141,9 @@ void GeneralEigenproblem() {
         std::vector<double> work = WorkFor(driver);
         Compare(
             ratios, "general", n,
-            [&] { qx::EigenGeneral(a.data(), n, 1, w.data(), vectors.data()); },
+            [&] {
+                qx::EigenGeneral<Real>({a.data(), n, n}, {w.data(), n}, {vectors.data(), n, n});
+            },
             [&] {
                 copy = a;
                 driver(work.data(), static_cast<int32_t>(work.size()));
@@ -160,7 +168,10 @@ void QR() {
         std::vector<double> work = WorkFor(factor), formWork = WorkFor(form);
         Compare(
             ratios, "qr", n,
-            [&] { qx::QRDecompose(a.data(), n, n, qx::qrFull, q.data(), r.data()); },
+            [&] {
+                qx::QRDecompose<Real>({a.data(), n, n}, qx::qrFull, {q.data(), n, n},
+                                      {r.data(), n, n});
+            },
             [&] {
                 copy = a;
                 factor(work.data(), static_cast<int32_t>(work.size()));
@@ -182,7 +193,7 @@ void Cholesky() {
             ratios, "cholesky", n,
             [&] {
                 work = packed;
-                qx::PackedCholesky(work.data(), n);
+                qx::PackedCholesky<Real>({work.data(), qx::PackedLength(n)}, n);
             },
             [&] {
                 copy = a;

@@ -61,6 +61,8 @@ void Compare(Ratios &ratios, const char *name, int32_t n, const Ours &ours, cons
     ratios.add(our / their, "n " + std::to_string(n));
 }
 
+constexpr auto Real = qx::ElementType::DBL;
+
 void Products() {
     Ratios ratios("matrix products of 64 and up");
     for (const int32_t n : {64, 100, 200, 500, 1000}) {
@@ -68,7 +70,9 @@ void Products() {
         std::vector<double> c(a.size());
         Compare(
             ratios, "product", n,
-            [&] { qx::MatrixProductPlain(a.data(), a.data(), n, n, n, c.data()); },
+            [&] {
+                qx::MatrixProduct<Real>({a.data(), n, n}, {a.data(), n, n}, {c.data(), n, n});
+            },
             [&] {
                 cblas_dgemm(CblasRowMajor, CblasNoTrans, CblasNoTrans, n, n, n, 1.0, a.data(), n,
                             a.data(), n, 0.0, c.data(), n);
@@ -85,7 +89,9 @@ void Ordered() {
         std::vector<double> c(a.size());
         Compare(
             ratios, "ordered product", n,
-            [&] { qx::OrderedProduct(a.data(), a.data(), n, n, n, c.data()); },
+            [&] {
+                qx::OrderedProduct<Real>({a.data(), n, n}, {a.data(), n, n}, {c.data(), n, n});
+            },
             [&] {
                 cblas_dgemm(CblasRowMajor, CblasNoTrans, CblasNoTrans, n, n, n, 1.0, a.data(), n,
                             a.data(), n, 0.0, c.data(), n);
@@ -113,16 +119,19 @@ std::vector<T> RandomOf(std::size_t count) {
     return x;
 }
 
-template <class T>
+template <qx::ElementType E>
 void Solve(const char *name, const char *peer, std::initializer_list<int32_t> sizes) {
     Ratios ratios(name);
     for (const int32_t n : sizes) {
+        typedef qx::ElementOf<E> T;
         const auto a = RandomOf<T>(static_cast<std::size_t>(n) * n), b = RandomOf<T>(n);
         std::vector<T> factors(a.size()), x(n), y(n);
         std::vector<int32_t> pivots(n);
         Compare(
-            ratios, sizeof(T) == sizeof(double) ? "solve" : "complex solve", n,
-            [&] { qx::SolveByLU(a.data(), n, b.data(), x.data()); },
+            ratios, E == Real ? "solve" : "complex solve", n,
+            [&] {
+                qx::SolveByLU<E>({a.data(), n, n}, {b.data(), n}, {x.data(), n});
+            },
             [&] {
                 factors = a;
                 y = b;
@@ -139,7 +148,10 @@ void Inverse() {
         std::vector<double> factors(a.size()), inverse(a.size()), other(a.size());
         std::vector<int32_t> pivots(n);
         Compare(
-            ratios, "inverse", n, [&] { qx::InvertByLU(a.data(), n, inverse.data()); },
+            ratios, "inverse", n,
+            [&] {
+                qx::InvertByLU<Real>({a.data(), n, n}, {inverse.data(), n, n});
+            },
             [&] {
                 int32_t info;
                 factors = a;
@@ -161,7 +173,7 @@ void Frame() {
     const auto [call, inner] =
         Times([&] { EqsByLUDri_head(a.handle(), b.handle(), x.handle(), &err); },
               [&] {
-                  qx::SolveByLU(a.data(), 1, b.data(), &y);
+                  qx::SolveByLU<Real>({a.data(), 1, 1}, {b.data(), 1}, {&y, 1});
                   Keep(y);
               });
     std::printf("frame of EqsByLUDri_head: %.0f ns (the call %.0f ns)\n", (call - inner) * 1e9,
@@ -182,13 +194,13 @@ int main(int argc, char **argv) {
     if (wanted("ordered"))
         Ordered();
     if (wanted("small"))
-        Solve<double>("linear systems up to 8 by 8", "LAPACK dgesv", {1, 2, 3, 4, 5, 6, 7, 8});
+        Solve<Real>("linear systems up to 8 by 8", "LAPACK dgesv", {1, 2, 3, 4, 5, 6, 7, 8});
     if (wanted("solve"))
-        Solve<double>("linear systems of 16 to 2000", "LAPACK dgesv",
-                      {16, 32, 64, 100, 200, 300, 500, 1000, 2000});
+        Solve<Real>("linear systems of 16 to 2000", "LAPACK dgesv",
+                    {16, 32, 64, 100, 200, 300, 500, 1000, 2000});
     if (wanted("complex"))
-        Solve<CDB>("complex linear systems of 1 to 1000", "LAPACK zgesv",
-                   {1, 2, 4, 8, 16, 32, 64, 100, 200, 500, 1000});
+        Solve<qx::ElementType::CDB>("complex linear systems of 1 to 1000", "LAPACK zgesv",
+                                    {1, 2, 4, 8, 16, 32, 64, 100, 200, 500, 1000});
     if (wanted("inverse"))
         Inverse();
     if (wanted("frame"))

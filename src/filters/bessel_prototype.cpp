@@ -80,7 +80,7 @@ ErrorCode FindPoles(int32_t n, double g, CDB *poles) {
         matrix[(k - 1) * n + k] = 1.0 / static_cast<double>(2 * k - 1);
         matrix[k * n + k - 1] = -1.0 / static_cast<double>(2 * k + 1);
     }
-    if (const ErrorCode failed = EigenGeneral(matrix.data(), n, eigenValuesOnly, poles, nullptr))
+    if (const ErrorCode failed = EigenGeneral<ElementType::DBL>({matrix.data(), n, n}, {poles, n}))
         return failed;
     for (int32_t i = 0; i < n; ++i) {
         const double re = poles[i].re * g, im = poles[i].im * g;

@@ -14,6 +14,8 @@
 namespace qx {
 namespace {
 
+constexpr auto Real = ElementType::DBL;
+
 // The fit as two matrices: powers (V, frame by terms) and coefficients (G, terms by frame).
 class PolynomialFit {
 public:
@@ -29,8 +31,9 @@ public:
         fillPowers();
         if (const ErrorCode failed = invertNormal(weights, transposed, inverse))
             return failed;
-        TransposeInto(powers_, frame_, terms_, transposed);
-        OrderedProduct(inverse, transposed, terms_, terms_, frame_, coefficients_);
+        CopyTransposed<Real>({powers_, frame_, terms_}, {transposed, terms_, frame_});
+        OrderedProduct<Real>({inverse, terms_, terms_}, {transposed, terms_, frame_},
+                             {coefficients_, terms_, frame_});
         if (weights != nullptr)
             for (std::ptrdiff_t i = 0; i < terms_; ++i)
                 for (std::ptrdiff_t j = 0; j < frame_; ++j)
@@ -41,8 +44,8 @@ public:
     const DBL *coefficients() const { return coefficients_; }
     // Rows of V G: what the samples add to the values at these places of the frame.
     void smoothing(int32_t firstRow, int32_t rows, DBL *out) const {
-        OrderedProduct(powers_ + std::ptrdiff_t{firstRow} * terms_, coefficients_, rows, terms_,
-                       frame_, out);
+        OrderedProduct<Real>({powers_ + std::ptrdiff_t{firstRow} * terms_, rows, terms_},
+                             {coefficients_, terms_, frame_}, {out, rows, frame_});
     }
     ErrorCode release() { return work_.release(); }
 
@@ -67,15 +70,17 @@ private:
             for (std::ptrdiff_t j = 0; j < terms_; ++j)
                 weighted[i * terms_ + j] = powers_[i * terms_ + j] * factor;
         }
-        if (const ErrorCode failed = QRDecompose(weighted, frame_, terms_, qrOnlyR, nullptr, r))
+        const RealMatrix triangle(r, terms_, terms_), transposed(packed, terms_, terms_);
+        const RealVector elements(packed, PackedLength(terms_));
+        if (const ErrorCode failed =
+                QRDecompose<Real>({weighted, frame_, terms_}, qrOnlyR, {}, triangle))
             return failed;
-        PackMatrix(r, terms_, upperTriangle, packed);
-        if (const ErrorCode failed = InvertTriangle(packed, terms_, upperTriangle))
+        PackMatrix<Real>(triangle, upperTriangle, elements);
+        if (const ErrorCode failed = InvertTriangle<Real>(elements, terms_, upperTriangle))
             return failed;
-        ExpandPacked(packed, terms_, upperTriangle, r);
-        DBL *const transposed = packed;
-        TransposeInto(r, terms_, terms_, transposed);
-        OrderedProduct(r, transposed, terms_, terms_, terms_, inverse);
+        ExpandPacked<Real>(elements, upperTriangle, triangle);
+        CopyTransposed<Real>(triangle, transposed);
+        OrderedProduct<Real>(triangle, transposed, {inverse, terms_, terms_});
         return 0;
     }
 
@@ -94,7 +99,7 @@ ErrorCode SmoothEnd(const PolynomialFit &fit, int32_t first, int32_t count, cons
     for (int32_t done = 0; done < count; done += rowsAtOnce) {
         const int32_t now = std::min(rowsAtOnce, count - done);
         fit.smoothing(first + done, now, rows.data());
-        MatrixVectorProduct(rows.data(), now, frame, x, y + done);
+        MatrixVectorProduct<Real>({rows.data(), now, frame}, {x, frame}, {y + done, now});
     }
     return rows.release();
 }

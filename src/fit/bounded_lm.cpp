@@ -121,10 +121,8 @@ ErrorCode EvalLeastAbsolute(const FitModel &model, const FitSamples &samples, Fi
 ErrorCode EvalBisquare(const FitModel &model, const FitSamples &samples, FitPoint &at,
                        EvaluationMemory &memory) {
     Reweighting &state = memory.state;
-    const int32_t count = model.count;
-    DBL *const a = at.a.data(), *const inverse = memory.inverse.data();
     EvalLeastSquares(model, samples, at, memory, memory.jacobian);
-    if (const ErrorCode failed = PseudoInverseMatrix(a, count, count, -1.0, inverse))
+    if (const ErrorCode failed = PseudoInverseMatrix<ElementType::DBL>(at.a, -1.0, memory.inverse))
         return failed;
     for (int32_t i = 0; i < samples.n(); ++i)
         state.factors[i] = samples.weight(i) * Leverage(memory.jacobian.row(i), memory.inverse);

@@ -26,9 +26,9 @@ ErrorCode SolveRowScaled(RealMatrix matrix, RealVector right, VectorView<Element
         g[i] = std::ldexp(g[i], -exponent);
     }
     int32_t parity;
-    if (LUDecompose(a, n, n, pivots, &parity) != 0)
+    if (LUDecompose<ElementType::DBL>({a, n, n}, {pivots, n}, &parity) != 0)
         return ErrSingularMatrix;
-    return LUSolve(a, pivots, g, n, 1, d);
+    return LUSolve<ElementType::DBL>({a, n, n}, {pivots, n}, {g, n, 1}, {d, n, 1});
 }
 
 ErrorCode AddDampedStep(RealMatrix a, RealVector g, double lambda, RealVector coefficients) {

@@ -15,7 +15,7 @@ constexpr double smallSquare = 0x1p-900, largeSquare = 0x1p900;
 
 double SumOfSquares(const DBL *v, int32_t n) {
     DBL squares;
-    RowProducts(v, n, 1, n, v, &squares);
+    RowProducts<ElementType::DBL>({v, 1, n}, {v, n}, {&squares, 1});
     return squares;
 }
 
@@ -109,12 +109,13 @@ void Elimination::reflect(int32_t j, const RowBlock &block) {
     r[j] = std::ldexp(beta, exponent);
 
     DBL *const products = row(k_);
-    RowProducts(block.column(j + 1), n, rest, n, v, products);
+    const RealMatrix others(block.column(j + 1), rest, n);
+    RowProducts<ElementType::DBL>(others, {v, n}, {products, rest});
     for (int32_t i = 0; i < rest; ++i) {
         products[i] = -(tau * (r[j + 1 + i] + products[i]));
         r[j + 1 + i] += products[i];
     }
-    AddOuterProduct(block.column(j + 1), n, rest, n, products, v);
+    AddOuterProduct<ElementType::DBL>(others, {products, rest}, {v, n});
 }
 
 } // namespace qx

@@ -7,7 +7,6 @@
 #include "linalg/factorisations/range.h"
 #include "linalg/factorisations/svd.h"
 #include "linalg/matrix.h"
-#include "linalg/products/ordered.h"
 #include "linalg/products/products.h"
 #include "linalg/systems/least_squares.h"
 #include "linalg/systems/lu.h"
@@ -32,8 +31,9 @@ ErrorCode TimesTranspose(const DBL *a, const DBL *b, int32_t k, DBL *out) {
     Scratch<ElementType::DBL> transposed;
     if (const ErrorCode failed = transposed.allocate(int64_t{k} * k))
         return failed;
-    TransposeInto(b, k, k, transposed.data());
-    OrderedProduct(a, transposed.data(), k, k, k, out);
+    const RealMatrix bTransposed(transposed.data(), k, k);
+    CopyTransposed<ElementType::DBL>({b, k, k}, bTransposed);
+    OrderedProduct<ElementType::DBL>({a, k, k}, bTransposed, {out, k, k});
     return 0;
 }
 
@@ -57,7 +57,7 @@ void EquilibrateColumns(DBL *r, int32_t k, I32 *exponents) {
 // One exponent for all columns, so that the singular values stay in proportion.
 void ScaleTogether(DBL *r, int32_t k, I32 *exponents) {
     // The decomposition takes what is far below 1 for zero.
-    const int exponent = BringIntoRange<ElementType::DBL>(r, k, k, k, 1.0);
+    const int exponent = BringIntoRange<ElementType::DBL>({r, k, k}, 1.0);
     for (int32_t j = 0; j < k; ++j)
         exponents[j] = exponent;
 }
@@ -82,7 +82,10 @@ ErrorCode SolveByValues(const LinearModel &model, const Elimination &triangle, i
         ScaleTogether(r, k, exponents.data());
     else
         EquilibrateColumns(r, k, exponents.data());
-    if (const ErrorCode failed = SVDecompose(r, k, k, u, s, v, 0))
+    if (CheckFinite(r, square) != 0)
+        return ErrNonFiniteInput;
+    if (const ErrorCode failed =
+            SVDecompose<ElementType::DBL>({r, k, k}, {u, k, k}, {s, k}, {v, k, k}))
         return failed;
 
     const double cut = method == byCutSVD ? model.n * s[0] * kEpsilon : 0.0;
@@ -121,9 +124,9 @@ ErrorCode SolveByTriangle(const LinearModel &model, const Elimination &triangle,
     const std::ptrdiff_t square = std::ptrdiff_t{k} * k;
     DBL *const r = memory.data(), *const transposed = r + square, *const normal = r + 2 * square;
     CopyTriangle(triangle, k, r);
-    TransposeInto(r, k, k, transposed);
-    OrderedProduct(transposed, r, k, k, k, normal);
-    return PseudoInverseMatrix(normal, k, k, -1.0, covariance);
+    CopyTransposed<ElementType::DBL>({r, k, k}, {transposed, k, k});
+    OrderedProduct<ElementType::DBL>({transposed, k, k}, {r, k, k}, {normal, k, k});
+    return PseudoInverseMatrix<ElementType::DBL>({normal, k, k}, -1.0, {covariance, k, k});
 }
 
 // The sums of the normal equations: [normal | right], k by k + 1, each element one sum over the
@@ -141,11 +144,12 @@ ErrorCode SumNormalEquations(const LinearModel &model, DBL *sums) {
         if (rows.data() == nullptr) // the first block is the largest
             if (const ErrorCode failed = rows.allocate(int64_t{count} * cols))
                 return failed;
-        TransposeInto(block.start, cols, count, rows.data());
+        CopyTransposed<ElementType::DBL>({block.start, cols, count}, {rows.data(), count, cols});
         for (int32_t j = 0; model.w != nullptr && j < k; ++j)
             for (int32_t i = 0; i < count; ++i)
                 block.column(j)[i] *= std::fabs(model.w[block.first + i]);
-        AddProduct(k, cols, count, block.start, count, rows.data(), cols, sums, cols);
+        AddProduct<ElementType::DBL>({block.start, k, count}, {rows.data(), count, cols},
+                                     {sums, k, cols});
     }
     return 0;
 }
@@ -164,13 +168,15 @@ ErrorCode SolveByNormalEquations(const LinearModel &model, int32_t method, DBL *
         std::memcpy(normal + i * k, sums + i * (k + 1), static_cast<std::size_t>(k) * sizeof(DBL));
         right[i] = sums[i * (k + 1) + k];
     }
+    const ConstRealMatrix matrix(normal, model.k, model.k);
     if (covariance != nullptr)
         if (const ErrorCode failed =
-                PseudoInverseMatrix(normal, model.k, model.k, -1.0, covariance))
+                PseudoInverseMatrix<ElementType::DBL>(matrix, -1.0, {covariance, model.k, model.k}))
             return failed;
     if (method == byLU)
-        return SolveByLU(normal, model.k, right, c);
-    const ErrorCode status = CholeskySolve(normal, model.k, 0, right, 1, c);
+        return SolveByLU<ElementType::DBL>(matrix, {right, model.k}, {c, model.k});
+    const ErrorCode status = CholeskySolve<ElementType::DBL>(matrix, lowerTriangle,
+                                                             {right, model.k, 1}, {c, model.k, 1});
     return status == ErrNotPositiveDefinite ? ErrSingularMatrix : status;
 }
 
@@ -198,7 +204,8 @@ ErrorCode FitGeneral(ConstRealMatrix h, const FitSamples &samples, int32_t algor
     const int32_t n = h.rows(), k = h.cols();
     const auto writeRows = [&](const RowBlock &block) {
         const auto bytes = static_cast<std::size_t>(block.count) * sizeof(DBL);
-        TransposeInto(h.row(block.first), block.count, k, block.start);
+        CopyTransposed<ElementType::DBL>(h.block(block.first, 0, block.count, k),
+                                         {block.start, k, block.count});
         std::memcpy(block.column(k), samples.y.data() + block.first, bytes);
     };
     DBL *const wanted = covariance.isEmpty() ? nullptr : covariance.data();

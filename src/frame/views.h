@@ -6,6 +6,7 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <cstring>
 
 namespace qx {
 
@@ -129,6 +130,15 @@ template <ElementType E>
 using MatrixView = BasicMatrixView<E, true>;
 template <ElementType E>
 using ConstMatrixView = BasicMatrixView<E, false>;
+
+// All elements of one vector into another of the same size, with which it shares none.
+template <ElementType E>
+void Copy(ConstVectorView<E> from, VectorView<E> to) {
+    QX_EXPECTS(from.size() == to.size());
+    if (!from.isEmpty())
+        std::memcpy(static_cast<void *>(to.data()), from.data(),
+                    sizeof(typename VectorView<E>::T) * static_cast<std::size_t>(from.size()));
+}
 
 typedef VectorView<ElementType::DBL> RealVector;
 typedef ConstVectorView<ElementType::DBL> ConstRealVector;

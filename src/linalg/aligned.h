@@ -4,32 +4,22 @@
 #include "frame/scratch.h"
 
 #include <cstdint>
-#include <limits>
 
 namespace qx {
 
-// A scratch block at a multiple of 64 bytes, for LAPACK: its compiled code may count on the
-// alignment of its elements, which scratch memory does not promise.
-template <ElementType E>
-class AlignedScratch {
-    typedef typename Element<E>::type T;
-
-public:
-    ErrorCode allocate(int64_t count) {
-        if (count < 0 || count > std::numeric_limits<int32_t>::max())
-            return ErrOutOfMemory;
-        return block_.allocate(count * int64_t{sizeof(T)} + alignment - 1);
-    }
-    T *data() const {
-        const auto address = reinterpret_cast<std::uintptr_t>(block_.bytes());
-        return reinterpret_cast<T *>((address + alignment - 1) & ~std::uintptr_t{alignment - 1});
-    }
-    T &operator[](std::ptrdiff_t i) const { return data()[i]; }
-
-private:
-    static constexpr int64_t alignment = 64;
-    ScratchBytes block_;
-};
+// A part of scratch memory at a multiple of 64 bytes, for LAPACK: its compiled code may count on
+// the alignment of its elements, which scratch memory does not promise.
+//     memory.take(Aligned(Sized(band, rows, n)), Aligned(Sized(pivots, n)))
+template <class Place>
+auto Aligned(const ScratchPart<Place> &part) {
+    constexpr std::uintptr_t alignment = 64;
+    const auto place = [given = part.place](void *at) {
+        const auto address = reinterpret_cast<std::uintptr_t>(at);
+        given(reinterpret_cast<void *>((address + alignment - 1) & ~(alignment - 1)));
+    };
+    const int64_t bytes = part.bytes < 0 ? part.bytes : part.bytes + int64_t{alignment} - 1;
+    return ScratchPart<decltype(place)>{place, bytes};
+}
 
 } // namespace qx
 

@@ -1,6 +1,7 @@
 #ifndef QX_LINALG_KERNELS_H
 #define QX_LINALG_KERNELS_H
 
+#include "frame/views.h"
 #include "frame/widths.h"
 #include "qx/types.h"
 
@@ -59,37 +60,30 @@ QX_BY_WIDTH(void, ReflectRows,
 QX_BY_WIDTH(void, ReflectColumns,
             (DBL * a, std::ptrdiff_t stride, int32_t rows, const SmallReflection *reflection))
 
-// The names by which templates over the element reach them.
-inline void AddTransposedProduct(const DBL *a, std::ptrdiff_t stride, int32_t rows, int32_t cols,
-                                 const DBL *x, DBL *y) {
-    AddTransposedProductReal(a, stride, rows, cols, x, y);
+// The first three for either element. x and y have as many elements as a has rows or columns.
+template <ElementType E>
+void AddTransposedProduct(ConstMatrixView<E> a, ConstVectorView<E> x, VectorView<E> y) {
+    QX_EXPECTS(x.size() == a.rows() && y.size() == a.cols());
+    if constexpr (E == ElementType::DBL)
+        AddTransposedProductReal(a.data(), a.stride(), a.rows(), a.cols(), x.data(), y.data());
+    else
+        AddTransposedProductComplex(a.data(), a.stride(), a.rows(), a.cols(), x.data(), y.data());
 }
-inline void AddTransposedProduct(const CDB *a, std::ptrdiff_t stride, int32_t rows, int32_t cols,
-                                 const CDB *x, CDB *y) {
-    AddTransposedProductComplex(a, stride, rows, cols, x, y);
+template <ElementType E>
+void AddOuterProduct(MatrixView<E> a, ConstVectorView<E> x, ConstVectorView<E> y) {
+    QX_EXPECTS(x.size() == a.rows() && y.size() == a.cols());
+    if constexpr (E == ElementType::DBL)
+        AddOuterProductReal(a.data(), a.stride(), a.rows(), a.cols(), x.data(), y.data());
+    else
+        AddOuterProductComplex(a.data(), a.stride(), a.rows(), a.cols(), x.data(), y.data());
 }
-inline void AddOuterProduct(DBL *a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const DBL *x,
-                            const DBL *y) {
-    AddOuterProductReal(a, stride, rows, cols, x, y);
-}
-inline void AddOuterProduct(CDB *a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const CDB *x,
-                            const CDB *y) {
-    AddOuterProductComplex(a, stride, rows, cols, x, y);
-}
-inline void RowProducts(const DBL *a, std::ptrdiff_t stride, int32_t rows, int32_t cols,
-                        const DBL *x, DBL *y) {
-    RowProductsReal(a, stride, rows, cols, x, y);
-}
-inline void RowProducts(const CDB *a, std::ptrdiff_t stride, int32_t rows, int32_t cols,
-                        const CDB *x, CDB *y) {
-    RowProductsComplex(a, stride, rows, cols, x, y);
-}
-
-// The distance of rows in scratch matrices: an odd number of cache lines, because with rows a
-// power of two apart a column falls into few sets of the cache.
-constexpr std::ptrdiff_t PaddedStride(int32_t cols) {
-    const std::ptrdiff_t lines = (std::ptrdiff_t{cols} + 7) / 8;
-    return 8 * (lines | 1);
+template <ElementType E>
+void RowProducts(ConstMatrixView<E> a, ConstVectorView<E> x, VectorView<E> y) {
+    QX_EXPECTS(x.size() == a.cols() && y.size() == a.rows());
+    if constexpr (E == ElementType::DBL)
+        RowProductsReal(a.data(), a.stride(), a.rows(), a.cols(), x.data(), y.data());
+    else
+        RowProductsComplex(a.data(), a.stride(), a.rows(), a.cols(), x.data(), y.data());
 }
 
 } // namespace qx

@@ -13,36 +13,39 @@ namespace qx {
 
 namespace blas {
 
-ErrorCode Product(int32_t m, int32_t n, int32_t k, const DBL *a, const DBL *b, DBL *c) {
-    const BlasMemory memory;
-    if (!memory)
-        return ErrOutOfMemory;
-    cblas_dgemm(CblasRowMajor, CblasNoTrans, CblasNoTrans, m, n, k, 1.0, a, k, b, n, 0.0, c, n);
-    return 0;
-}
-
 namespace {
 
-ErrorCode ComplexProduct(CBLAS_TRANSPOSE transposition, int32_t m, int32_t n, int32_t k,
-                         const CDB *a, const CDB *b, int32_t bCols, CDB *c) {
+template <class View>
+int32_t LeadingOf(const View &a) {
+    return static_cast<int32_t>(a.stride());
+}
+
+ErrorCode ComplexProduct(CBLAS_TRANSPOSE transposition, ConstComplexMatrix a, ConstComplexMatrix b,
+                         ComplexMatrix c) {
     const BlasMemory memory;
     if (!memory)
         return ErrOutOfMemory;
     const CDB one = {1.0, 0.0}, zero = {0.0, 0.0};
-    cblas_zgemm(CblasRowMajor, CblasNoTrans, transposition, m, n, k, &one, a, k, b, bCols, &zero, c,
-                n);
+    cblas_zgemm(CblasRowMajor, CblasNoTrans, transposition, c.rows(), c.cols(), a.cols(), &one,
+                a.data(), LeadingOf(a), b.data(), LeadingOf(b), &zero, c.data(), LeadingOf(c));
     return 0;
 }
 
 } // namespace
 
-ErrorCode Product(int32_t m, int32_t n, int32_t k, const CDB *a, const CDB *b, CDB *c) {
-    return ComplexProduct(CblasNoTrans, m, n, k, a, b, n, c);
+ErrorCode Product(ConstRealMatrix a, ConstRealMatrix b, RealMatrix c) {
+    const BlasMemory memory;
+    if (!memory)
+        return ErrOutOfMemory;
+    cblas_dgemm(CblasRowMajor, CblasNoTrans, CblasNoTrans, c.rows(), c.cols(), a.cols(), 1.0,
+                a.data(), LeadingOf(a), b.data(), LeadingOf(b), 0.0, c.data(), LeadingOf(c));
+    return 0;
 }
-
-ErrorCode ProductWithConjugate(int32_t m, int32_t n, int32_t k, const CDB *a, const CDB *b,
-                               CDB *c) {
-    return ComplexProduct(CblasConjTrans, m, n, k, a, b, k, c);
+ErrorCode Product(ConstComplexMatrix a, ConstComplexMatrix b, ComplexMatrix c) {
+    return ComplexProduct(CblasNoTrans, a, b, c);
+}
+ErrorCode ProductWithConjugate(ConstComplexMatrix a, ConstComplexMatrix b, ComplexMatrix c) {
+    return ComplexProduct(CblasConjTrans, a, b, c);
 }
 
 } // namespace blas
@@ -99,39 +102,39 @@ char Job(const void *vectors) { return vectors != nullptr ? 'V' : 'N'; }
 
 int32_t Schur(int32_t n, DBL *t, CDB *w, DBL *z) {
     const BlasMemory memory;
-    AlignedScratch<ElementType::DBL> values, work;
-    if (!memory || values.allocate(2 * int64_t{n}) != 0)
+    ScratchParts results, working;
+    DBL *wr, *wi, *work, size;
+    if (!memory || results.take(Aligned(Sized(wr, n)), Aligned(Sized(wi, n))) != 0)
         return noMemory;
     const char job = Job(z);
-    DBL size, *const wi = values.data() + n;
     int32_t info = 0, selected = 0, length = -1;
-    LAPACK_dgees(&job, "N", nullptr, &n, t, &n, &selected, values.data(), wi, z, &n, &size, &length,
-                 nullptr, &info);
+    LAPACK_dgees(&job, "N", nullptr, &n, t, &n, &selected, wr, wi, z, &n, &size, &length, nullptr,
+                 &info);
     length = Answer(&size);
-    if (work.allocate(length) != 0)
+    if (working.take(Aligned(Sized(work, length))) != 0)
         return noMemory;
-    LAPACK_dgees(&job, "N", nullptr, &n, t, &n, &selected, values.data(), wi, z, &n, work.data(),
-                 &length, nullptr, &info);
+    LAPACK_dgees(&job, "N", nullptr, &n, t, &n, &selected, wr, wi, z, &n, work, &length, nullptr,
+                 &info);
     for (int32_t i = 0; i < n; ++i)
-        w[i] = {values[i], wi[i]};
+        w[i] = {wr[i], wi[i]};
     return info;
 }
 int32_t Schur(int32_t n, CDB *t, CDB *w, CDB *z) {
     const BlasMemory memory;
-    AlignedScratch<ElementType::DBL> real;
-    AlignedScratch<ElementType::CDB> work, values;
-    if (!memory || real.allocate(n) != 0 || values.allocate(n) != 0)
+    ScratchParts results, working;
+    DBL *real;
+    CDB *values, *work, size;
+    if (!memory || results.take(Aligned(Sized(real, n)), Aligned(Sized(values, n))) != 0)
         return noMemory;
     const char job = Job(z);
-    CDB size;
     int32_t info = 0, selected = 0, length = -1;
-    LAPACK_zgees(&job, "N", nullptr, &n, t, &n, &selected, values.data(), z, &n, &size, &length,
-                 real.data(), nullptr, &info);
+    LAPACK_zgees(&job, "N", nullptr, &n, t, &n, &selected, values, z, &n, &size, &length, real,
+                 nullptr, &info);
     length = Answer(&size);
-    if (work.allocate(length) != 0)
+    if (working.take(Aligned(Sized(work, length))) != 0)
         return noMemory;
-    LAPACK_zgees(&job, "N", nullptr, &n, t, &n, &selected, values.data(), z, &n, work.data(),
-                 &length, real.data(), nullptr, &info);
+    LAPACK_zgees(&job, "N", nullptr, &n, t, &n, &selected, values, z, &n, work, &length, real,
+                 nullptr, &info);
     for (int32_t i = 0; i < n; ++i)
         w[i] = values[i];
     return info;
@@ -139,12 +142,13 @@ int32_t Schur(int32_t n, CDB *t, CDB *w, CDB *z) {
 
 int32_t MoveInSchur(int32_t n, DBL *t, DBL *z, int32_t from, int32_t to) {
     const BlasMemory memory;
-    AlignedScratch<ElementType::DBL> work;
-    if (!memory || work.allocate(n) != 0)
+    ScratchParts working;
+    DBL *work;
+    if (!memory || working.take(Aligned(Sized(work, n))) != 0)
         return noMemory;
     const char job = Job(z);
     int32_t info = 0, first = from + 1, last = to + 1;
-    LAPACK_dtrexc(&job, &n, t, &n, z, &n, &first, &last, work.data(), &info);
+    LAPACK_dtrexc(&job, &n, t, &n, z, &n, &first, &last, work, &info);
     return info;
 }
 int32_t MoveInSchur(int32_t n, CDB *t, CDB *z, int32_t from, int32_t to) {
@@ -160,18 +164,19 @@ int32_t MoveInSchur(int32_t n, CDB *t, CDB *z, int32_t from, int32_t to) {
 
 int32_t GeneralisedSchur(int32_t n, DBL *s, DBL *t, CDB *alpha, DBL *beta, DBL *q, DBL *z) {
     const BlasMemory memory;
-    AlignedScratch<ElementType::DBL> values, work;
-    if (!memory || values.allocate(3 * int64_t{n}) != 0)
+    ScratchParts results, working;
+    DBL *re, *im, *divisor, *work, size;
+    if (!memory ||
+        results.take(Aligned(Sized(re, n)), Aligned(Sized(im, n)), Aligned(Sized(divisor, n))) != 0)
         return noMemory;
-    DBL size, *const re = values.data(), *const im = re + n, *const divisor = im + n;
     int32_t info = 0, selected = 0, length = -1;
     LAPACK_dgges("V", "V", "N", nullptr, &n, s, &n, t, &n, &selected, re, im, divisor, q, &n, z, &n,
                  &size, &length, nullptr, &info);
     length = Answer(&size);
-    if (work.allocate(length) != 0)
+    if (working.take(Aligned(Sized(work, length))) != 0)
         return noMemory;
     LAPACK_dgges("V", "V", "N", nullptr, &n, s, &n, t, &n, &selected, re, im, divisor, q, &n, z, &n,
-                 work.data(), &length, nullptr, &info);
+                 work, &length, nullptr, &info);
     for (int32_t i = 0; i < n; ++i) {
         alpha[i] = {re[i], im[i]};
         beta[i] = divisor[i];
@@ -180,19 +185,20 @@ int32_t GeneralisedSchur(int32_t n, DBL *s, DBL *t, CDB *alpha, DBL *beta, DBL *
 }
 int32_t GeneralisedSchur(int32_t n, CDB *s, CDB *t, CDB *alpha, CDB *beta, CDB *q, CDB *z) {
     const BlasMemory memory;
-    AlignedScratch<ElementType::CDB> values, work;
-    AlignedScratch<ElementType::DBL> real;
-    if (!memory || values.allocate(2 * int64_t{n}) != 0 || real.allocate(8 * int64_t{n}) != 0)
+    ScratchParts results, working;
+    CDB *dividend, *divisor, *work, size;
+    DBL *real;
+    if (!memory || results.take(Aligned(Sized(dividend, n)), Aligned(Sized(divisor, n)),
+                                Aligned(Sized(real, 8 * int64_t{n}))) != 0)
         return noMemory;
-    CDB size, *const dividend = values.data(), *const divisor = dividend + n;
     int32_t info = 0, selected = 0, length = -1;
     LAPACK_zgges("V", "V", "N", nullptr, &n, s, &n, t, &n, &selected, dividend, divisor, q, &n, z,
-                 &n, &size, &length, real.data(), nullptr, &info);
+                 &n, &size, &length, real, nullptr, &info);
     length = Answer(&size);
-    if (work.allocate(length) != 0)
+    if (working.take(Aligned(Sized(work, length))) != 0)
         return noMemory;
     LAPACK_zgges("V", "V", "N", nullptr, &n, s, &n, t, &n, &selected, dividend, divisor, q, &n, z,
-                 &n, work.data(), &length, real.data(), nullptr, &info);
+                 &n, work, &length, real, nullptr, &info);
     for (int32_t i = 0; i < n; ++i) {
         alpha[i] = dividend[i];
         beta[i] = divisor[i];
@@ -203,13 +209,13 @@ int32_t GeneralisedSchur(int32_t n, CDB *s, CDB *t, CDB *alpha, CDB *beta, CDB *
 int32_t MoveInGeneralisedSchur(int32_t n, DBL *s, DBL *t, DBL *q, DBL *z, int32_t from,
                                int32_t to) {
     const BlasMemory memory;
-    AlignedScratch<ElementType::DBL> work;
+    ScratchParts working;
+    DBL *work;
     const int32_t length = 4 * n + 16, yes = 1;
-    if (!memory || work.allocate(length) != 0)
+    if (!memory || working.take(Aligned(Sized(work, length))) != 0)
         return noMemory;
     int32_t info = 0, first = from + 1, last = to + 1;
-    LAPACK_dtgexc(&yes, &yes, &n, s, &n, t, &n, q, &n, z, &n, &first, &last, work.data(), &length,
-                  &info);
+    LAPACK_dtgexc(&yes, &yes, &n, s, &n, t, &n, q, &n, z, &n, &first, &last, work, &length, &info);
     return info;
 }
 int32_t MoveInGeneralisedSchur(int32_t n, CDB *s, CDB *t, CDB *q, CDB *z, int32_t from,
@@ -225,62 +231,67 @@ int32_t MoveInGeneralisedSchur(int32_t n, CDB *s, CDB *t, CDB *q, CDB *z, int32_
 
 int32_t GeneralisedVectors(int32_t n, const DBL *s, const DBL *t, DBL *z) {
     const BlasMemory memory;
-    AlignedScratch<ElementType::DBL> work;
-    if (!memory || work.allocate(6 * int64_t{n}) != 0)
+    ScratchParts working;
+    DBL *work;
+    if (!memory || working.take(Aligned(Sized(work, 6 * int64_t{n}))) != 0)
         return noMemory;
     int32_t info = 0, found = 0;
-    LAPACK_dtgevc("R", "B", nullptr, &n, s, &n, t, &n, nullptr, &n, z, &n, &n, &found, work.data(),
-                  &info);
+    LAPACK_dtgevc("R", "B", nullptr, &n, s, &n, t, &n, nullptr, &n, z, &n, &n, &found, work, &info);
     return info;
 }
 int32_t GeneralisedVectors(int32_t n, const CDB *s, const CDB *t, CDB *z) {
     const BlasMemory memory;
-    AlignedScratch<ElementType::CDB> work;
-    AlignedScratch<ElementType::DBL> real;
-    if (!memory || work.allocate(2 * int64_t{n}) != 0 || real.allocate(2 * int64_t{n}) != 0)
+    ScratchParts working;
+    CDB *work;
+    DBL *real;
+    if (!memory || working.take(Aligned(Sized(work, 2 * int64_t{n})),
+                                Aligned(Sized(real, 2 * int64_t{n}))) != 0)
         return noMemory;
     int32_t info = 0, found = 0;
-    LAPACK_ztgevc("R", "B", nullptr, &n, s, &n, t, &n, nullptr, &n, z, &n, &n, &found, work.data(),
-                  real.data(), &info);
+    LAPACK_ztgevc("R", "B", nullptr, &n, s, &n, t, &n, nullptr, &n, z, &n, &n, &found, work, real,
+                  &info);
     return info;
 }
 
-int32_t GeneralisedSingular(int32_t m, int32_t n, int32_t p, DBL *a, DBL *b, SingularRanks *ranks,
-                            DBL *alpha, DBL *beta, DBL *u, DBL *v, DBL *q) {
+int32_t GeneralisedSingular(int32_t m, int32_t n, int32_t p, DBL *a, DBL *b,
+                            GeneralisedRanks *ranks, DBL *alpha, DBL *beta, DBL *u, DBL *v,
+                            DBL *q) {
     const BlasMemory memory;
-    AlignedScratch<ElementType::I32> order;
-    AlignedScratch<ElementType::DBL> work;
-    if (!memory || order.allocate(n) != 0)
+    ScratchParts results, working;
+    I32 *order;
+    DBL *work, size;
+    if (!memory || results.take(Aligned(Sized(order, n))) != 0)
         return noMemory;
-    DBL size;
     int32_t info = 0, length = -1, k = 0, l = 0;
     LAPACK_dggsvd3("U", "V", "Q", &m, &n, &p, &k, &l, a, &m, b, &p, alpha, beta, u, &m, v, &p, q,
-                   &n, &size, &length, order.data(), &info);
+                   &n, &size, &length, order, &info);
     length = Answer(&size);
-    if (work.allocate(length) != 0)
+    if (working.take(Aligned(Sized(work, length))) != 0)
         return noMemory;
     LAPACK_dggsvd3("U", "V", "Q", &m, &n, &p, &k, &l, a, &m, b, &p, alpha, beta, u, &m, v, &p, q,
-                   &n, work.data(), &length, order.data(), &info);
+                   &n, work, &length, order, &info);
     *ranks = {k, l};
     return info;
 }
-int32_t GeneralisedSingular(int32_t m, int32_t n, int32_t p, CDB *a, CDB *b, SingularRanks *ranks,
-                            DBL *alpha, DBL *beta, CDB *u, CDB *v, CDB *q) {
+int32_t GeneralisedSingular(int32_t m, int32_t n, int32_t p, CDB *a, CDB *b,
+                            GeneralisedRanks *ranks, DBL *alpha, DBL *beta, CDB *u, CDB *v,
+                            CDB *q) {
     const BlasMemory memory;
-    AlignedScratch<ElementType::I32> order;
-    AlignedScratch<ElementType::CDB> work;
-    AlignedScratch<ElementType::DBL> real;
-    if (!memory || order.allocate(n) != 0 || real.allocate(2 * int64_t{n}) != 0)
+    ScratchParts results, working;
+    I32 *order;
+    DBL *real;
+    CDB *work, size;
+    if (!memory ||
+        results.take(Aligned(Sized(order, n)), Aligned(Sized(real, 2 * int64_t{n}))) != 0)
         return noMemory;
-    CDB size;
     int32_t info = 0, length = -1, k = 0, l = 0;
     LAPACK_zggsvd3("U", "V", "Q", &m, &n, &p, &k, &l, a, &m, b, &p, alpha, beta, u, &m, v, &p, q,
-                   &n, &size, &length, real.data(), order.data(), &info);
+                   &n, &size, &length, real, order, &info);
     length = Answer(&size);
-    if (work.allocate(length) != 0)
+    if (working.take(Aligned(Sized(work, length))) != 0)
         return noMemory;
     LAPACK_zggsvd3("U", "V", "Q", &m, &n, &p, &k, &l, a, &m, b, &p, alpha, beta, u, &m, v, &p, q,
-                   &n, work.data(), &length, real.data(), order.data(), &info);
+                   &n, work, &length, real, order, &info);
     *ranks = {k, l};
     return info;
 }

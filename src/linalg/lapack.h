@@ -1,27 +1,33 @@
 #ifndef QX_LINALG_LAPACK_H
 #define QX_LINALG_LAPACK_H
 
+#include "frame/views.h"
 #include "qx/errors.h"
-#include "qx/types.h"
 
 #include <cstdint>
 
 namespace qx {
 
+// The ranks of a generalised singular value decomposition.
+struct GeneralisedRanks {
+    int32_t k, l;
+};
+
 // What the library calls of BLAS and LAPACK, overloaded by element. Nothing else includes their
 // headers. Their kernels differ between processors, and so do the last bits of what goes through
-// them. LAPACK's matrices are column after column: see TransposeMatrix.
+// them. LAPACK's matrices are column after column and without gaps, hence plain pointers and sizes:
+// see CopyTransposed.
 
 namespace blas {
 
-// Each returns 0 or ErrOutOfMemory.
+// Each returns 0 or ErrOutOfMemory. No matrix is empty.
 
-// c = a b, all row after row: a is m by k, b k by n. The sizes are positive.
-ErrorCode Product(int32_t m, int32_t n, int32_t k, const DBL *a, const DBL *b, DBL *c);
-ErrorCode Product(int32_t m, int32_t n, int32_t k, const CDB *a, const CDB *b, CDB *c);
+// c = a b.
+ErrorCode Product(ConstRealMatrix a, ConstRealMatrix b, RealMatrix c);
+ErrorCode Product(ConstComplexMatrix a, ConstComplexMatrix b, ComplexMatrix c);
 
-// c = a b^H, all row after row: a is m by k, b n by k.
-ErrorCode ProductWithConjugate(int32_t m, int32_t n, int32_t k, const CDB *a, const CDB *b, CDB *c);
+// c = a b^H.
+ErrorCode ProductWithConjugate(ConstComplexMatrix a, ConstComplexMatrix b, ComplexMatrix c);
 
 } // namespace blas
 
@@ -46,7 +52,7 @@ int32_t SolveTridiagonal(bool transposed, int32_t n, int32_t rightSides, const D
                          const I32 *pivots, DBL *b);
 
 // What follows takes scratch memory of its own for LAPACK's work. All matrices are of order n and
-// stand in AlignedScratch.
+// are Aligned (linalg/aligned.h).
 
 // Schur form of t: t becomes triangular, or for real elements quasi-triangular, w its eigenvalues,
 // and z its Schur vectors; with z null there are none. Above 0: no convergence.
@@ -68,13 +74,10 @@ int32_t GeneralisedVectors(int32_t n, const DBL *s, const DBL *t, DBL *z);
 int32_t GeneralisedVectors(int32_t n, const CDB *s, const CDB *t, CDB *z);
 
 // Generalised singular values of a (m by n) and b (p by n), as LAPACK's xGGSVD3 tells.
-struct SingularRanks {
-    int32_t k, l;
-};
-int32_t GeneralisedSingular(int32_t m, int32_t n, int32_t p, DBL *a, DBL *b, SingularRanks *ranks,
-                            DBL *alpha, DBL *beta, DBL *u, DBL *v, DBL *q);
-int32_t GeneralisedSingular(int32_t m, int32_t n, int32_t p, CDB *a, CDB *b, SingularRanks *ranks,
-                            DBL *alpha, DBL *beta, CDB *u, CDB *v, CDB *q);
+int32_t GeneralisedSingular(int32_t m, int32_t n, int32_t p, DBL *a, DBL *b,
+                            GeneralisedRanks *ranks, DBL *alpha, DBL *beta, DBL *u, DBL *v, DBL *q);
+int32_t GeneralisedSingular(int32_t m, int32_t n, int32_t p, CDB *a, CDB *b,
+                            GeneralisedRanks *ranks, DBL *alpha, DBL *beta, CDB *u, CDB *v, CDB *q);
 
 } // namespace lapack
 

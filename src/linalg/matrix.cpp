@@ -1,8 +1,6 @@
 #include "linalg/matrix.h"
 
-#include "frame/scratch.h"
-
-#include <cstring>
+#include <algorithm>
 
 namespace qx {
 
@@ -11,46 +9,13 @@ namespace {
 // kept: the lower bound is a truncated constant, so the last numbers above -DBL_MAX are refused.
 bool IsRefused(double x) { return !(x < 0x1.fffffffffffffp1023 && x > -1.7976931348623e308); }
 
-// Tiles that fit into the first cache, so that neither side is read or written in long strides.
-constexpr int32_t tile = 16;
-
-template <ElementType E>
-void Transpose(const typename Element<E>::type *a, std::ptrdiff_t rows, std::ptrdiff_t cols,
-               typename Element<E>::type *out) {
-    for (std::ptrdiff_t top = 0; top < rows; top += tile) {
-        const std::ptrdiff_t bottom = top + tile < rows ? top + tile : rows;
-        for (std::ptrdiff_t j = 0; j < cols; ++j)
-            for (std::ptrdiff_t i = top; i < bottom; ++i)
-                out[j * rows + i] = a[i * cols + j];
-    }
-}
-
-template <ElementType E>
-ErrorCode TransposeOrCopy(typename Element<E>::type *a, int32_t rows, int32_t cols,
-                          typename Element<E>::type *out) {
-    const int64_t count = int64_t{rows} * cols;
-    const bool isVector = rows == 1 || cols == 1;
-    if (out == nullptr && isVector)
-        return 0;
-    if (isVector) {
-        std::memcpy(out, a, static_cast<std::size_t>(count) * sizeof *a);
-        return 0;
-    }
-    if (out != nullptr) {
-        Transpose<E>(a, rows, cols, out);
-        return 0;
-    }
-    Scratch<E> copy;
-    if (const ErrorCode failed = copy.allocate(count))
-        return failed;
-    std::memcpy(copy.data(), a, static_cast<std::size_t>(count) * sizeof *a);
-    Transpose<E>(copy.data(), rows, cols, a);
-    return 0;
-}
+// Rows that fit into the first cache together, so that neither side is read or written in long
+// strides.
+constexpr int32_t rowsAtOnce = 16;
 
 // Visits the packed elements in their order: at(i, j, packed element).
 template <class At>
-void ForEachPacked(std::ptrdiff_t n, int32_t triangle, At at) {
+void ForEachPacked(std::ptrdiff_t n, Triangle triangle, At at) {
     std::ptrdiff_t next = 0;
     for (std::ptrdiff_t j = 0; j < n; ++j) {
         const std::ptrdiff_t first = triangle == upperTriangle ? 0 : j;
@@ -58,29 +23,6 @@ void ForEachPacked(std::ptrdiff_t n, int32_t triangle, At at) {
         for (std::ptrdiff_t i = first; i <= last; ++i)
             at(i, j, next++);
     }
-}
-
-template <ElementType E>
-void Pack(const typename Element<E>::type *a, std::ptrdiff_t n, int32_t triangle,
-          typename Element<E>::type *packed) {
-    ForEachPacked(n, triangle, [=](std::ptrdiff_t i, std::ptrdiff_t j, std::ptrdiff_t at) {
-        packed[at] = a[i * n + j];
-    });
-}
-
-template <ElementType E>
-void Expand(const typename Element<E>::type *packed, std::ptrdiff_t n, int32_t triangle,
-            typename Element<E>::type *a) {
-    ForEachPacked(n, triangle, [=](std::ptrdiff_t i, std::ptrdiff_t j, std::ptrdiff_t at) {
-        // The mirror image first: on the diagonal the element itself stands.
-        if (triangle == symmetric)
-            a[j * n + i] = packed[at];
-        else if (triangle == hermitian)
-            a[j * n + i] = Conj(packed[at]);
-        else
-            a[j * n + i] = ScalarOf<E>::Of(0.0);
-        a[i * n + j] = packed[at];
-    });
 }
 
 } // namespace
@@ -92,39 +34,89 @@ ErrorCode CheckFinite(const DBL *x, int64_t n) {
     return 0;
 }
 
-ErrorCode CheckFinite(const CDB *x, int64_t n) { return CheckFinite(&x->re, 2 * n); }
-
-ErrorCode TransposeMatrix(DBL *a, int32_t rows, int32_t cols, DBL *out) {
-    return TransposeOrCopy<ElementType::DBL>(a, rows, cols, out);
-}
-ErrorCode TransposeMatrix(CDB *a, int32_t rows, int32_t cols, CDB *out) {
-    return TransposeOrCopy<ElementType::CDB>(a, rows, cols, out);
-}
-void TransposeInto(const DBL *a, int32_t rows, int32_t cols, DBL *out) {
-    Transpose<ElementType::DBL>(a, rows, cols, out);
-}
-void TransposeInto(const CDB *a, int32_t rows, int32_t cols, CDB *out) {
-    Transpose<ElementType::CDB>(a, rows, cols, out);
+template <ElementType E>
+bool AllFinite(ConstVectorView<E> x) {
+    return CheckFinite(reinterpret_cast<const DBL *>(x.data()), partsOf<E> * x.size()) == 0;
 }
 
-int32_t OrderOfPacked(int32_t length) {
+template <ElementType E>
+bool AllFinite(ConstMatrixView<E> a) {
+    if (a.isWhole())
+        return AllFinite<E>(a.elements());
+    for (int32_t i = 0; i < a.rows(); ++i)
+        if (!AllFinite<E>({a.row(i), a.cols()}))
+            return false;
+    return true;
+}
+
+template <ElementType E>
+void CopyMatrix(ConstMatrixView<E> from, MatrixView<E> to) {
+    QX_EXPECTS(to.rows() == from.rows() && to.cols() == from.cols());
+    for (int32_t i = 0; i < from.rows(); ++i)
+        Copy<E>({from.row(i), from.cols()}, {to.row(i), to.cols()});
+}
+
+template <ElementType E>
+void CopyTransposed(ConstMatrixView<E> from, MatrixView<E> to) {
+    QX_EXPECTS(to.rows() == from.cols() && to.cols() == from.rows());
+    for (int32_t top = 0; top < from.rows(); top += rowsAtOnce) {
+        const int32_t bottom = std::min(top + rowsAtOnce, from.rows());
+        for (int32_t j = 0; j < from.cols(); ++j)
+            for (int32_t i = top; i < bottom; ++i)
+                to(j, i) = from(i, j);
+    }
+}
+
+template <ElementType E>
+void SetIdentity(MatrixView<E> a) {
+    for (int32_t i = 0; i < a.rows(); ++i)
+        for (int32_t j = 0; j < a.cols(); ++j)
+            a(i, j) = ScalarOf<E>::Of(i == j ? 1.0 : 0.0);
+}
+
+int32_t OrderOfPacked(int64_t length) {
     if (length < 0)
         return -1;
-    const auto n = static_cast<int32_t>(std::floor(std::sqrt(2.0 * length)));
+    const auto n = static_cast<int32_t>(std::floor(std::sqrt(2.0 * static_cast<double>(length))));
     return PackedLength(n) == length ? n : -1;
 }
 
-void PackMatrix(const DBL *a, int32_t n, int32_t triangle, DBL *packed) {
-    Pack<ElementType::DBL>(a, n, triangle, packed);
+template <ElementType E>
+void PackMatrix(ConstMatrixView<E> a, Triangle triangle, VectorView<E> packed) {
+    QX_EXPECTS(a.isSquare() && packed.size() >= PackedLength(a.rows()));
+    ForEachPacked(a.rows(), triangle, [=](std::ptrdiff_t i, std::ptrdiff_t j, std::ptrdiff_t at) {
+        packed[at] = a(i, j);
+    });
 }
-void PackMatrix(const CDB *a, int32_t n, int32_t triangle, CDB *packed) {
-    Pack<ElementType::CDB>(a, n, triangle, packed);
+
+template <ElementType E>
+void ExpandPacked(ConstVectorView<E> packed, Triangle triangle, MatrixView<E> a) {
+    QX_EXPECTS(a.isSquare() && packed.size() >= PackedLength(a.rows()));
+    ForEachPacked(a.rows(), triangle, [=](std::ptrdiff_t i, std::ptrdiff_t j, std::ptrdiff_t at) {
+        // The mirror image first: on the diagonal the element itself stays.
+        if (triangle == symmetric)
+            a(j, i) = packed[at];
+        else if (triangle == hermitian)
+            a(j, i) = Conj(packed[at]);
+        else
+            a(j, i) = ScalarOf<E>::Of(0.0);
+        a(i, j) = packed[at];
+    });
 }
-void ExpandPacked(const DBL *packed, int32_t n, int32_t triangle, DBL *a) {
-    Expand<ElementType::DBL>(packed, n, triangle, a);
-}
-void ExpandPacked(const CDB *packed, int32_t n, int32_t triangle, CDB *a) {
-    Expand<ElementType::CDB>(packed, n, triangle, a);
-}
+
+template bool AllFinite(ConstRealVector);
+template bool AllFinite(ConstComplexVector);
+template bool AllFinite(ConstRealMatrix);
+template bool AllFinite(ConstComplexMatrix);
+template void CopyMatrix(ConstRealMatrix, RealMatrix);
+template void CopyMatrix(ConstComplexMatrix, ComplexMatrix);
+template void CopyTransposed(ConstRealMatrix, RealMatrix);
+template void CopyTransposed(ConstComplexMatrix, ComplexMatrix);
+template void SetIdentity(RealMatrix);
+template void SetIdentity(ComplexMatrix);
+template void PackMatrix(ConstRealMatrix, Triangle, RealVector);
+template void PackMatrix(ConstComplexMatrix, Triangle, ComplexVector);
+template void ExpandPacked(ConstRealVector, Triangle, RealMatrix);
+template void ExpandPacked(ConstComplexVector, Triangle, ComplexMatrix);
 
 } // namespace qx

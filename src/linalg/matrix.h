@@ -1,45 +1,86 @@
 #ifndef QX_LINALG_MATRIX_H
 #define QX_LINALG_MATRIX_H
 
+#include "frame/scratch.h"
+#include "frame/views.h"
 #include "linalg/scalar.h"
 #include "qx/errors.h"
-#include "qx/types.h"
 
 #include <cstdint>
 
 namespace qx {
 
-// What all matrix routines share. Matrices are bare pointers to their elements, row after row.
-// Names are overloaded by element: real and complex forms of a routine are one text, a template
-// keyed by ElementType behind these names.
+// What all matrix routines share. Real and complex forms of a routine are one template of the
+// element, called as CopyMatrix<E>(from, to). Unless a routine says otherwise, its outputs share no
+// element with its inputs.
 
-// 1 if an element is NaN or infinite, else 0. The largest finite number is refused as well, and
-// so is whatever is not above -1.7976931348623e308.
+typedef VectorView<ElementType::I32> IndexVector;
+typedef ConstVectorView<ElementType::I32> ConstIndexVector;
+
+// A vector as a matrix of one column, or of one row.
+template <ElementType E, bool Writable>
+BasicMatrixView<E, Writable> AsColumn(BasicVectorView<E, Writable> x) {
+    return {x.data(), static_cast<int32_t>(x.size()), 1};
+}
+template <ElementType E, bool Writable>
+BasicMatrixView<E, Writable> AsRow(BasicVectorView<E, Writable> x) {
+    return {x.data(), 1, static_cast<int32_t>(x.size())};
+}
+// A matrix as the real numbers that its elements are made of.
+template <ElementType E>
+RealMatrix PartsOf(MatrixView<E> a) {
+    return {reinterpret_cast<DBL *>(a.data()), a.rows(), a.cols() * partsOf<E>,
+            a.stride() * partsOf<E>};
+}
+
+// Whether no element is NaN or infinite. The largest finite number is refused as well, and so is
+// whatever is not above -1.7976931348623e308.
+template <ElementType E>
+bool AllFinite(ConstVectorView<E> x);
+template <ElementType E>
+bool AllFinite(ConstMatrixView<E> a);
+// The same for n numbers: 0, or 1 where one is refused.
 ErrorCode CheckFinite(const DBL *x, int64_t n);
-ErrorCode CheckFinite(const CDB *x, int64_t n);
 
-// The transpose, without conjugation; a null `out` means in place. A matrix with one dimension of
-// 1 is copied, or in place left as it is.
-// ErrOutOfMemory where the place is needed and there is no scratch memory.
-ErrorCode TransposeMatrix(DBL *a, int32_t rows, int32_t cols, DBL *out);
-ErrorCode TransposeMatrix(CDB *a, int32_t rows, int32_t cols, CDB *out);
-void TransposeInto(const DBL *a, int32_t rows, int32_t cols, DBL *out);
-void TransposeInto(const CDB *a, int32_t rows, int32_t cols, CDB *out);
+template <ElementType E>
+void CopyMatrix(ConstMatrixView<E> from, MatrixView<E> to);
+// to[j][i] = from[i][j], without conjugation.
+template <ElementType E>
+void CopyTransposed(ConstMatrixView<E> from, MatrixView<E> to);
+template <ElementType E>
+void SetIdentity(MatrixView<E> a);
 
 // Packed triangular storage of a matrix of order n: n(n+1)/2 elements, column after column of the
 // lower triangle (rows j to n-1) or of the upper one (rows 0 to j).
 enum Triangle : int32_t { lowerTriangle = 0, upperTriangle = 1, symmetric = 2, hermitian = 3 };
 constexpr int64_t PackedLength(int32_t n) { return int64_t{n} * (int64_t{n} + 1) / 2; }
 // The order that a packed length belongs to, floor(sqrt(2 length)), or -1 where it fits none.
-int32_t OrderOfPacked(int32_t length);
+int32_t OrderOfPacked(int64_t length);
 
 // A square matrix into packed storage and back. Packing the last two takes the lower triangle;
 // expanding fills the other triangle with zeros, or with its mirror image, which is conjugated in a
 // Hermitian matrix.
-void PackMatrix(const DBL *a, int32_t n, int32_t triangle, DBL *packed);
-void PackMatrix(const CDB *a, int32_t n, int32_t triangle, CDB *packed);
-void ExpandPacked(const DBL *packed, int32_t n, int32_t triangle, DBL *a);
-void ExpandPacked(const CDB *packed, int32_t n, int32_t triangle, CDB *a);
+template <ElementType E>
+void PackMatrix(ConstMatrixView<E> a, Triangle triangle, VectorView<E> packed);
+template <ElementType E>
+void ExpandPacked(ConstVectorView<E> packed, Triangle triangle, MatrixView<E> a);
+
+// The distance of rows in scratch matrices: an odd number of cache lines, because with rows a
+// power of two apart a column falls into few sets of the cache.
+constexpr std::ptrdiff_t PaddedStride(int32_t cols) {
+    const std::ptrdiff_t lines = (std::ptrdiff_t{cols} + 7) / 8;
+    return 8 * (lines | 1);
+}
+// A scratch matrix with such rows, for ScratchParts::take.
+template <ElementType E>
+auto SizedPadded(MatrixView<E> &view, int32_t rows, int32_t cols) {
+    typedef typename MatrixView<E>::T T;
+    const auto place = [&view, rows, cols](void *at) {
+        view = MatrixView<E>(static_cast<T *>(at), rows, cols, PaddedStride(cols));
+    };
+    const int64_t count = int64_t{rows} * PaddedStride(cols);
+    return ScratchPart<decltype(place)>{place, BytesOf(count, sizeof(T))};
+}
 
 } // namespace qx
 

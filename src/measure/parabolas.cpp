@@ -24,7 +24,8 @@ ErrorCode BuildFitMatrix(int32_t w, DBL *fitMatrix) {
         row[2] = t * t;
     }
     constexpr double defaultTolerance = -1;
-    return PseudoInverseMatrix(powers.data(), w, 3, defaultTolerance, fitMatrix);
+    return PseudoInverseMatrix<ElementType::DBL>({powers.data(), w, 3}, defaultTolerance,
+                                                 {fitMatrix, 3, w});
 }
 
 } // namespace qx

@@ -36,8 +36,9 @@ void LeastSquaresSystem::addProductBy(const CDB *a, int32_t degree, int32_t shif
 // The right side as one more column becomes Q^H times it.
 ErrorCode LeastSquaresSystem::solve(CDB *x) {
     CDB *const r = triangle_.data();
-    if (const ErrorCode failed = QRDecompose(augmented_.data(), static_cast<int32_t>(rows_),
-                                             static_cast<int32_t>(width()), qrOnlyR, nullptr, r))
+    const auto rows = static_cast<int32_t>(rows_), cols = static_cast<int32_t>(width());
+    if (const ErrorCode failed = QRDecompose<ElementType::CDB>(
+            {augmented_.data(), rows, cols}, qrOnlyR, {}, {r, std::min(rows, cols), cols}))
         return failed;
     for (std::ptrdiff_t i = cols_ - 1; i >= 0; --i) {
         CDB sum = r[i * width() + cols_];

@@ -26,14 +26,14 @@ public:
         if (const ErrorCode failed = work_.allocate(int64_t{powers_} * elements_))
             return failed;
         for (int32_t j = 2; j <= powers_; ++j)
-            OrderedProduct(power(j - 1), a_, order_, order_, order_, powerPlace(j));
+            OrderedProduct<E>(square(power(j - 1)), square(a_), square(powerPlace(j)));
         for (std::ptrdiff_t i = 0; i < elements_; ++i)
             y[i] = ScalarOf<E>::Of(0.0);
         int32_t k = degree_ > 0 ? (degree_ - 1) / powers_ * powers_ : 0;
         addBlock(k, degree_ - k, y);
         for (k -= powers_; k >= 0; k -= powers_) {
             T *const product = powerPlace(1); // the first power is a itself
-            OrderedProduct(y, power(powers_), order_, order_, order_, product);
+            OrderedProduct<E>(square(y), square(power(powers_)), square(product));
             for (std::ptrdiff_t i = 0; i < elements_; ++i)
                 y[i] = product[i];
             addBlock(k, powers_ - 1, y);
@@ -42,6 +42,9 @@ public:
     }
 
 private:
+    MatrixView<E> square(T *elements) const { return {elements, order_, order_}; }
+    ConstMatrixView<E> square(const T *elements) const { return {elements, order_, order_}; }
+
     // The root of the degree makes the fewest products; the powers keep within 32 MB or eight
     // matrices.
     void chooseBlocks() {

@@ -18,12 +18,6 @@ constexpr auto Complex = ElementType::CDB;
 
 void CoefficientOf(CDB coefficient, DBL *out) { *out = coefficient.re; }
 void CoefficientOf(CDB coefficient, CDB *out) { *out = coefficient; }
-ErrorCode Eigenvalues(const DBL *a, int32_t n, CDB *values) {
-    return EigenGeneral(a, n, eigenValuesOnly, values, nullptr);
-}
-ErrorCode Eigenvalues(const CDB *a, int32_t n, CDB *values) {
-    return CxEigenGeneral(a, n, generalMatrix, eigenValuesOnly, values, nullptr);
-}
 
 template <ElementType E>
 ErrorCode EigenvaluesOfCompanion(const CDB *p, int32_t degree, CDB *roots) {
@@ -35,7 +29,7 @@ ErrorCode EigenvaluesOfCompanion(const CDB *p, int32_t degree, CDB *roots) {
             CoefficientOf({i == j + 1 ? 1.0 : 0.0, 0.0}, &companion[i * degree + j]);
         CoefficientOf(-p[i + 1], &companion[i]);
     }
-    const ErrorCode status = Eigenvalues(companion.data(), degree, roots);
+    const ErrorCode status = EigenGeneral<E>({companion.data(), degree, degree}, {roots, degree});
     return Merge(status, companion.release());
 }
 

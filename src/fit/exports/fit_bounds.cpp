@@ -236,7 +236,8 @@ Outcome MatrixBounds(In<DBL2D> h, const Samples &samples, double confidence, con
         return failed;
     const DBL *const c = samples.coefficients.data();
     const auto writeRows = [&](const RowBlock &block) {
-        TransposeInto(h.data() + std::ptrdiff_t{block.first} * k, block.count, k, block.start);
+        CopyTransposed<ElementType::DBL>(h.view().block(block.first, 0, block.count, k),
+                                         {block.start, k, block.count});
         DBL *const value = block.column(k);
         Fill(value, block.count, 0.0);
         for (int32_t j = 0; j < k; ++j)

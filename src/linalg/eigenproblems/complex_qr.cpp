@@ -2,7 +2,6 @@
 
 #include "linalg/complex_functions.h"
 #include "linalg/kernels.h"
-#include "qx/errors.h"
 
 #include <algorithm>
 #include <cmath>
@@ -31,12 +30,10 @@ struct ComplexRotation {
 
 class ComplexQR {
 public:
-    ComplexQR(CDB *h, std::ptrdiff_t stride, int32_t n, Balanced range, double negligible,
-              CDB *transposed)
-        : h_(h), stride_(stride), n_(n), range_(range), negligible_(negligible),
-          transposed_(transposed) {}
+    ComplexQR(ComplexMatrix h, Balanced range, double negligible, ComplexMatrix transposed)
+        : h_(h), n_(h.rows()), range_(range), negligible_(negligible), transposed_(transposed) {}
 
-    ErrorCode run(CDB *values) {
+    ErrorCode run(ComplexVector values) {
         for (int32_t i = 0; i < n_; ++i)
             for (int32_t j = std::max(i - 1, 0); j < n_; ++j)
                 norm_ += AbsSum(at(i, j));
@@ -62,7 +59,7 @@ public:
 private:
     static constexpr int32_t limit = 40;
 
-    CDB &at(int32_t i, int32_t j) const { return h_[i * stride_ + j]; }
+    CDB &at(int32_t i, int32_t j) const { return h_(i, j); }
 
     int32_t startOfBlock(int32_t last) const {
         int32_t l = last;
@@ -99,13 +96,13 @@ private:
         for (int32_t k = l; k < last; ++k) {
             const ComplexRotation rotation(x, y);
             const int32_t from = std::max(k - 1, l);
-            const int32_t to = transposed_ != nullptr ? n_ : last + 1;
+            const int32_t to = wantsVectors() ? n_ : last + 1;
             RotateComplexRows(&at(k, from), &at(k + 1, from), to - from, rotation.c, rotation.s);
-            const int32_t top = transposed_ != nullptr ? 0 : l;
+            const int32_t top = wantsVectors() ? 0 : l;
             rotateColumns(top, std::min(k + 2, last), k, rotation);
-            if (transposed_ != nullptr)
-                RotateComplexRows(transposed_ + k * stride_, transposed_ + (k + 1) * stride_, n_,
-                                  rotation.c, Conj(rotation.s));
+            if (wantsVectors())
+                RotateComplexRows(transposed_.row(k), transposed_.row(k + 1), n_, rotation.c,
+                                  Conj(rotation.s));
             if (k > l)
                 at(k + 1, k - 1) = {0.0, 0.0};
             x = at(k + 1, k);
@@ -121,20 +118,21 @@ private:
         }
     }
 
-    CDB *h_;
-    std::ptrdiff_t stride_;
+    bool wantsVectors() const { return !transposed_.isEmpty(); }
+
+    ComplexMatrix h_;
     int32_t n_;
     Balanced range_;
     double negligible_;
-    CDB *transposed_;
+    ComplexMatrix transposed_;
     double norm_ = 0.0;
 };
 
 } // namespace
 
-ErrorCode ComplexSchurIteration(CDB *h, std::ptrdiff_t stride, int32_t n, Balanced range,
-                                double negligible, CDB *values, CDB *transposed) {
-    return ComplexQR(h, stride, n, range, negligible, transposed).run(values);
+ErrorCode ComplexSchurIteration(ComplexMatrix h, Balanced range, double negligible,
+                                ComplexVector values, ComplexMatrix transposed) {
+    return ComplexQR(h, range, negligible, transposed).run(values);
 }
 
 } // namespace qx

@@ -7,12 +7,12 @@
 namespace qx {
 
 // The single-shift QR iteration on a complex Hessenberg matrix h, in the block `range`. With
-// `transposed`, which holds the transposed basis in rows `stride` apart as those of h are, h
-// becomes the triangular Schur form and `transposed` its transposed vectors; with null only the
-// values come out. An element beside the diagonal counts as 0 where it is within eps of its
-// neighbours or at most `negligible`. ErrIterationLimit.
-ErrorCode ComplexSchurIteration(CDB *h, std::ptrdiff_t stride, int32_t n, Balanced range,
-                                double negligible, CDB *values, CDB *transposed);
+// `transposed`, which holds the transposed basis, h becomes the triangular Schur form and
+// `transposed` its transposed vectors; without it only the values come out. An element beside the
+// diagonal counts as 0 where it is within eps of its neighbours or at most `negligible`.
+// ErrIterationLimit.
+ErrorCode ComplexSchurIteration(ComplexMatrix h, Balanced range, double negligible,
+                                ComplexVector values, ComplexMatrix transposed);
 
 } // namespace qx
 

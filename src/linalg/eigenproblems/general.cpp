@@ -1,13 +1,10 @@
 #include "linalg/eigenproblems/general.h"
 
-#include "frame/scratch.h"
 #include "linalg/eigenproblems/real_qr.h"
 #include "linalg/factorisations/balance.h"
 #include "linalg/factorisations/hessenberg.h"
 #include "linalg/factorisations/range.h"
 #include "linalg/kernels.h"
-#include "linalg/matrix.h"
-#include "linalg/transpose.h"
 
 #include <algorithm>
 #include <cmath>
@@ -15,13 +12,15 @@
 namespace qx {
 namespace {
 
-// Eigenvectors of the quasi-triangular matrix that the iteration leaves, by back substitution. x and y are
-// the real and the imaginary part of a vector, of which elements 0 to `last` are not 0.
+constexpr auto E = ElementType::DBL;
+
+// Eigenvectors of the quasi-triangular matrix that the iteration leaves, by back substitution. x
+// and y are the real and the imaginary part of a vector, of which elements 0 to `last` are not 0.
 class QuasiTriangular {
 public:
-    QuasiTriangular(const DBL *t, std::ptrdiff_t stride, double norm, const CDB *values, DBL *x,
-                    DBL *y)
-        : t_(t), stride_(stride), norm_(norm > 0.0 ? norm : 1.0), values_(values), x_(x), y_(y) {}
+    QuasiTriangular(ConstRealMatrix t, double norm, ConstComplexVector values, RealVector x,
+                    RealVector y)
+        : t_(t), norm_(norm > 0.0 ? norm : 1.0), values_(values), x_(x), y_(y) {}
 
     void realVector(int32_t last) {
         const double value = values_[last].re;
@@ -70,14 +69,15 @@ public:
     }
 
 private:
-    double at(int32_t i, int32_t j) const { return t_[i * stride_ + j]; }
+    double at(int32_t i, int32_t j) const { return t_(i, j); }
     void set(int32_t i, CDB value) {
         x_[i] = value.re;
         y_[i] = value.im;
     }
-    double product(int32_t i, int32_t from, int32_t to, const DBL *v) const {
+    double product(int32_t i, int32_t from, int32_t to, ConstRealVector v) const {
         DBL sum;
-        RowProductsReal(t_ + i * stride_ + from, stride_, 1, to + 1 - from, v + from, &sum);
+        const int32_t count = to + 1 - from;
+        RowProducts<E>(t_.block(i, from, 1, count), v.part(from, count), {&sum, 1});
         return sum;
     }
 
@@ -134,43 +134,34 @@ private:
         }
     }
 
-    const DBL *t_;
-    std::ptrdiff_t stride_;
+    ConstRealMatrix t_;
     double norm_;
-    const CDB *values_;
-    DBL *x_, *y_;
+    ConstComplexVector values_;
+    RealVector x_, y_;
 };
 
 class RealEigenproblem {
 public:
-    explicit RealEigenproblem(int32_t n) : n_(n), stride_(PaddedStride(n)) {}
-
-    ErrorCode solve(const DBL *a, bool withVectors, CDB *values, CDB *vectors) {
-        const int64_t square = n_ * int64_t{stride_};
-        if (const ErrorCode failed = matrix_.allocate(square))
-            return failed;
-        if (const ErrorCode failed = schur_.allocate(withVectors ? 2 * square : 0))
-            return failed;
-        if (const ErrorCode failed = vectors_.allocate(5 * int64_t{n_}))
-            return failed;
-
-        DBL *const h = matrix_.data(), *const scale = vectors_.data();
-        CopyMatrix<ElementType::DBL>(a, n_, n_, n_, h, stride_);
-        const int exponent = BringIntoRange<ElementType::DBL>(h, stride_, n_, n_, 0x1p-400);
-        const Balanced range = Balance<ElementType::DBL>(h, stride_, n_, true, true, scale);
-        DBL *const q = withVectors ? schur_.data() + square : nullptr;
-        if (const ErrorCode failed = ReduceToHessenberg<ElementType::DBL>(h, stride_, n_, range.low,
-                                                                          range.high, q, stride_))
-            return failed;
-
-        const double norm = SumOfHessenberg(h, stride_, n_);
-        if (withVectors)
-            CopyTransposed<ElementType::DBL>(q, stride_, n_, n_, schur_.data(), stride_);
-        DBL *const transposed = withVectors ? schur_.data() : nullptr;
+    ErrorCode solve(ConstRealMatrix a, ComplexVector values, ComplexMatrix vectors) {
+        n_ = a.rows();
+        const int32_t order = vectors.isEmpty() ? 0 : n_; // of the matrices for vectors
+        RealMatrix q;
         if (const ErrorCode failed =
-                RealSchurIteration(h, stride_, n_, range, 0.0, values, transposed))
+                memory_.take(SizedPadded(matrix_, n_, n_), SizedPadded(transposed_, order, order),
+                             SizedPadded(q, order, order), Sized(scale_, n_), Sized(x_, n_),
+                             Sized(y_, n_), Sized(re_, n_), Sized(im_, n_)))
             return failed;
-        if (withVectors)
+
+        CopyMatrix<E>(a, matrix_);
+        const int exponent = BringIntoRange<E>(matrix_, 0x1p-400);
+        const Balanced range = Balance<E>(matrix_, true, true, scale_);
+        if (const ErrorCode failed = ReduceToHessenberg<E>(matrix_, range.low, range.high, q))
+            return failed;
+        const double norm = SumOfHessenberg(matrix_);
+        CopyTransposed<E>(q, transposed_);
+        if (const ErrorCode failed = RealSchurIteration(matrix_, range, 0.0, values, transposed_))
+            return failed;
+        if (!vectors.isEmpty())
             writeVectors(norm, range, values, vectors);
         for (int32_t i = 0; exponent != 0 && i < n_; ++i)
             values[i] = {std::ldexp(values[i].re, exponent), std::ldexp(values[i].im, exponent)};
@@ -178,65 +169,62 @@ public:
     }
 
 private:
-    void writeVectors(double norm, Balanced range, const CDB *values, CDB *vectors) {
-        DBL *const x = vectors_.data() + n_, *const y = x + n_;
-        DBL *const re = y + n_, *const im = re + n_;
-        QuasiTriangular triangle(matrix_.data(), stride_, norm, values, x, y);
+    void writeVectors(double norm, Balanced range, ConstComplexVector values,
+                      ComplexMatrix vectors) {
+        QuasiTriangular triangle(matrix_, norm, values, x_, y_);
         for (int32_t j = n_ - 1; j >= 0; --j) {
             const bool isPair = values[j].im < 0.0;
-            Fill(y, n_, 0.0);
-            Fill(im, n_, 0.0);
+            Fill(y_.data(), n_, 0.0);
+            Fill(im_.data(), n_, 0.0);
             if (isPair) {
                 triangle.complexVector(j);
-                transformBack(y, j, range, im);
+                transformBack(y_, j, range, im_);
             } else {
                 triangle.realVector(j);
             }
-            transformBack(x, j, range, re);
-            normalise(re, im);
+            transformBack(x_, j, range, re_);
+            normalise();
             for (int32_t i = 0; i < n_; ++i) {
-                vectors[i * n_ + j] = {re[i], isPair ? -im[i] : im[i]};
+                vectors(i, j) = {re_[i], isPair ? -im_[i] : im_[i]};
                 if (isPair)
-                    vectors[i * n_ + j - 1] = {re[i], im[i]};
+                    vectors(i, j - 1) = {re_[i], im_[i]};
             }
             j -= isPair;
         }
     }
-    void transformBack(const DBL *x, int32_t last, Balanced range, DBL *v) {
-        Fill(v, n_, 0.0);
-        AddTransposedProductReal(schur_.data(), stride_, last + 1, n_, x, v);
-        constexpr auto side = EigenvectorSide::Right;
-        UndoScaling<ElementType::DBL>(vectors_.data(), range, side, v, 1, 1);
-        UndoPermutation<ElementType::DBL>(vectors_.data(), range, n_, v, 1, 1);
+    void transformBack(ConstRealVector x, int32_t last, Balanced range, RealVector v) {
+        Fill(v.data(), n_, 0.0);
+        AddTransposedProduct<E>(transposed_.block(0, 0, last + 1, n_), x.part(0, last + 1), v);
+        UndoScaling<E>(scale_, range, EigenvectorSide::Right, AsColumn(v));
+        UndoPermutation<E>(scale_, range, AsColumn(v));
     }
-    void normalise(DBL *re, DBL *im) const {
+    void normalise() const {
         double squares = 0.0;
         for (int32_t i = 0; i < n_; ++i)
-            squares += re[i] * re[i] + im[i] * im[i];
+            squares += re_[i] * re_[i] + im_[i] * im_[i];
         if (!(squares > 0.0))
             return;
         const double length = std::sqrt(squares);
         for (int32_t i = 0; i < n_; ++i) {
-            re[i] /= length;
-            im[i] /= length;
+            re_[i] /= length;
+            im_[i] /= length;
         }
     }
 
-    int32_t n_;
-    std::ptrdiff_t stride_;
-    Scratch<ElementType::DBL> matrix_, schur_, vectors_; // scale, x, y and the finished vector
+    int32_t n_ = 0;
+    ScratchParts memory_;
+    RealMatrix matrix_, transposed_;
+    RealVector scale_, x_, y_, re_, im_;
 };
 
 } // namespace
 
-ErrorCode EigenGeneral(const DBL *a, int32_t n, int32_t output, CDB *values, CDB *vectors) {
-    if (n < 1)
-        return ErrEmptyInput;
-    if (output != eigenValuesOnly && output != eigenValuesAndVectors)
-        return ErrInvalidSelector;
-    if (CheckFinite(a, int64_t{n} * n) != 0)
+template <>
+ErrorCode EigenGeneral(ConstRealMatrix a, ComplexVector values, ComplexMatrix vectors) {
+    QX_EXPECTS(a.isSquare() && !a.isEmpty() && values.size() == a.rows());
+    if (!AllFinite<E>(a))
         return ErrNonFiniteInput;
-    return RealEigenproblem(n).solve(a, output == eigenValuesAndVectors, values, vectors);
+    return RealEigenproblem().solve(a, values, vectors);
 }
 
 } // namespace qx

@@ -12,13 +12,9 @@ namespace {
 // Reflections of the rows of the transposed Schur vectors, collected and applied many at a time.
 class ReflectionQueue {
 public:
-    void direct(DBL *a, std::ptrdiff_t stride, int32_t width) {
-        a_ = a;
-        stride_ = stride;
-        width_ = width;
-    }
+    explicit ReflectionQueue(RealMatrix a) : a_(a) {}
     void add(const SmallReflection &reflection) {
-        if (a_ == nullptr)
+        if (a_.isEmpty())
             return;
         queue_[count_++] = reflection;
         if (count_ == capacity)
@@ -26,20 +22,19 @@ public:
     }
     void rotate(const Rotation &rotation) {
         flush();
-        if (a_ != nullptr)
-            RotateRows(a_, stride_, width_, &rotation, 1);
+        if (!a_.isEmpty())
+            RotateRows(a_.data(), a_.stride(), a_.cols(), &rotation, 1);
     }
     void flush() {
         if (count_ > 0)
-            ReflectRows(a_, stride_, width_, queue_, count_);
+            ReflectRows(a_.data(), a_.stride(), a_.cols(), queue_, count_);
         count_ = 0;
     }
 
 private:
     static constexpr int32_t capacity = 256;
-    DBL *a_ = nullptr;
-    std::ptrdiff_t stride_ = 0;
-    int32_t width_ = 0, count_ = 0;
+    RealMatrix a_;
+    int32_t count_ = 0;
     SmallReflection queue_[capacity];
 };
 
@@ -48,12 +43,10 @@ private:
 // matrix becomes quasi-triangular, without them only the part that the eigenvalues need is kept up.
 class RealQR {
 public:
-    RealQR(DBL *h, std::ptrdiff_t stride, int32_t n, Balanced range, double negligible, CDB *values,
-           DBL *transposed)
-        : h_(h), stride_(stride), n_(n), range_(range), negligible_(negligible), values_(values),
-          wantsVectors_(transposed != nullptr), norm_(SumOfHessenberg(h, stride, n)) {
-        vectors_.direct(transposed, stride, n_);
-    }
+    RealQR(RealMatrix h, Balanced range, double negligible, ComplexVector values,
+           RealMatrix transposed)
+        : h_(h), n_(h.rows()), range_(range), negligible_(negligible), values_(values),
+          wantsVectors_(!transposed.isEmpty()), norm_(SumOfHessenberg(h)), vectors_(transposed) {}
 
     ErrorCode run() {
         for (int32_t i = 0; i < n_; ++i)
@@ -83,7 +76,7 @@ public:
 private:
     static constexpr int32_t limit = 40;
 
-    DBL &at(int32_t i, int32_t j) const { return h_[i * stride_ + j]; }
+    DBL &at(int32_t i, int32_t j) const { return h_(i, j); }
 
     int32_t startOfBlock(int32_t last) const {
         int32_t l = last;
@@ -132,7 +125,7 @@ private:
         const double length = std::sqrt((x / scale) * (x / scale) + (z / scale) * (z / scale));
         const double s = x / scale / length, c = z / scale / length;
         const Rotation rotation{0, 1, c, s};
-        RotateRows(&at(first, first), stride_, n_ - first, &rotation, 1);
+        RotateRows(&at(first, first), h_.stride(), n_ - first, &rotation, 1);
         for (int32_t i = 0; i <= last; ++i) {
             const double left = at(i, first), right = at(i, last);
             at(i, first) = c * left + s * right;
@@ -220,19 +213,18 @@ private:
 
         const int32_t from = k, to = wantsVectors_ ? n_ : last + 1;
         const SmallReflection rows{0, size, {1.0, q, r}, {x, y, z}};
-        ReflectRows(&at(k, from), stride_, to - from, &rows, 1);
+        ReflectRows(&at(k, from), h_.stride(), to - from, &rows, 1);
         SmallReflection columns{k, size, {x, y, z}, {1.0, q, r}};
         vectors_.add(columns);
         const int32_t top = wantsVectors_ ? 0 : l;
-        ReflectColumns(&at(top, 0), stride_, std::min(last, k + 3) + 1 - top, &columns);
+        ReflectColumns(&at(top, 0), h_.stride(), std::min(last, k + 3) + 1 - top, &columns);
     }
 
-    DBL *h_;
-    std::ptrdiff_t stride_;
+    RealMatrix h_;
     int32_t n_;
     Balanced range_;
     double negligible_;
-    CDB *values_;
+    ComplexVector values_;
     bool wantsVectors_;
     double norm_;
     double shift_ = 0.0; // what has been taken from the diagonal
@@ -241,17 +233,17 @@ private:
 
 } // namespace
 
-double SumOfHessenberg(const DBL *h, std::ptrdiff_t stride, int32_t n) {
+double SumOfHessenberg(ConstRealMatrix h) {
     double sum = 0.0;
-    for (int32_t i = 0; i < n; ++i)
-        for (int32_t j = std::max(i - 1, 0); j < n; ++j)
-            sum += std::fabs(h[i * stride + j]);
+    for (int32_t i = 0; i < h.rows(); ++i)
+        for (int32_t j = std::max(i - 1, 0); j < h.cols(); ++j)
+            sum += std::fabs(h(i, j));
     return sum;
 }
 
-ErrorCode RealSchurIteration(DBL *h, std::ptrdiff_t stride, int32_t n, Balanced range,
-                             double negligible, CDB *values, DBL *transposed) {
-    return RealQR(h, stride, n, range, negligible, values, transposed).run();
+ErrorCode RealSchurIteration(RealMatrix h, Balanced range, double negligible, ComplexVector values,
+                             RealMatrix transposed) {
+    return RealQR(h, range, negligible, values, transposed).run();
 }
 
 } // namespace qx

@@ -7,16 +7,16 @@
 namespace qx {
 
 // The sum of the absolute values of a Hessenberg matrix.
-double SumOfHessenberg(const DBL *h, std::ptrdiff_t stride, int32_t n);
+double SumOfHessenberg(ConstRealMatrix h);
 
 // The double-shift QR iteration on a real Hessenberg matrix h, in the block `range`. With
-// `transposed`, which holds the transposed basis in rows `stride` apart as those of h are, h
-// becomes the quasi-triangular Schur form and `transposed` its transposed vectors; with null only
-// the values come out. The form has a block of two where a value has a positive imaginary part, and
-// what it holds elsewhere below its diagonal means nothing. An element beside the diagonal counts
-// as 0 where it is within eps of its neighbours or at most `negligible`. ErrIterationLimit.
-ErrorCode RealSchurIteration(DBL *h, std::ptrdiff_t stride, int32_t n, Balanced range,
-                             double negligible, CDB *values, DBL *transposed);
+// `transposed`, which holds the transposed basis, h becomes the quasi-triangular Schur form and
+// `transposed` its transposed vectors; without it only the values come out. The form has a block of
+// two where a value has a positive imaginary part, and what it holds elsewhere below its diagonal
+// means nothing. An element beside the diagonal counts as 0 where it is within eps of its
+// neighbours or at most `negligible`. ErrIterationLimit.
+ErrorCode RealSchurIteration(RealMatrix h, Balanced range, double negligible, ComplexVector values,
+                             RealMatrix transposed);
 
 } // namespace qx
 

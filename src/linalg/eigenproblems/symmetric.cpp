@@ -1,12 +1,8 @@
 #include "linalg/eigenproblems/symmetric.h"
 
-#include "frame/scratch.h"
-#include "linalg/eigenproblems/general.h"
 #include "linalg/factorisations/bidiagonal.h"
 #include "linalg/factorisations/range.h"
 #include "linalg/factorisations/reflector.h"
-#include "linalg/matrix.h"
-#include "linalg/transpose.h"
 
 #include <algorithm>
 #include <cmath>
@@ -18,7 +14,8 @@ namespace {
 // beside d[i] and d[i + 1]. The rotations go to `rows`, which holds the transposed vectors.
 class ImplicitQL {
 public:
-    ImplicitQL(DBL *d, DBL *e, int32_t n, RotationQueue &rows) : d_(d), e_(e), n_(n), rows_(rows) {}
+    ImplicitQL(RealVector d, RealVector e, RotationQueue &rows)
+        : d_(d), e_(e), n_(static_cast<int32_t>(d.size())), rows_(rows) {}
 
     ErrorCode run() {
         for (int32_t l = 0; l < n_; ++l)
@@ -70,7 +67,7 @@ private:
         e_[m] = 0.0;
     }
 
-    DBL *d_, *e_;
+    RealVector d_, e_;
     int32_t n_;
     RotationQueue &rows_;
 };
@@ -81,75 +78,64 @@ class SymmetricProblem {
     typedef Reflector<E> Reflection;
 
 public:
-    explicit SymmetricProblem(int32_t n) : n_(n), stride_(PaddedStride(n)) {}
-
-    ErrorCode solve(const T *a, bool withVectors, DBL *values, T *vectors) {
-        const int64_t square = n_ * int64_t{stride_};
-        if (const ErrorCode failed = matrix_.allocate(square))
-            return failed;
-        if (const ErrorCode failed = basis_.allocate(withVectors ? square : 0))
-            return failed;
-        if (const ErrorCode failed = vectors_.allocate(6 * int64_t{n_}))
-            return failed;
-        if (const ErrorCode failed = beside_.allocate(n_))
-            return failed;
-        Scratch<ElementType::I32> order;
-        if (const ErrorCode failed = order.allocate(n_))
+    ErrorCode solve(ConstMatrixView<E> a, RealVector values, MatrixView<E> vectors) {
+        const bool withVectors = !vectors.isEmpty();
+        IndexVector order;
+        n_ = a.rows();
+        if (const ErrorCode failed = memory_.take(
+                SizedPadded(matrix_, n_, n_), SizedPadded(basis_, withVectors ? n_ : 0, n_),
+                Sized(kappa_, n_), Sized(product_, n_), Sized(work_, 4 * int64_t{n_}),
+                Sized(beside_, n_), Sized(order, n_)))
             return failed;
 
         for (int32_t i = 0; i < n_; ++i)
             for (int32_t j = 0; j <= i; ++j) {
-                at(j)[i] = Conj(a[i * n_ + j]);
-                at(i)[j] = i == j ? T(ScalarOf<E>::Of(RealPart(a[i * n_ + j]))) : a[i * n_ + j];
+                matrix_(j, i) = Conj(a(i, j));
+                matrix_(i, j) = i == j ? T(ScalarOf<E>::Of(RealPart(a(i, j)))) : a(i, j);
             }
-        const int exponent = BringIntoRange<E>(matrix_.data(), stride_, n_, n_, 0x1p-400);
+        const int exponent = BringIntoRange<E>(matrix_, 0x1p-400);
         reduce(values);
         if (withVectors)
             accumulate();
-        constexpr int32_t parts = partsOf<E>;
-        RotationQueue rotations(withVectors ? reinterpret_cast<DBL *>(matrix_.data()) : nullptr,
-                                stride_ * parts, n_ * parts);
-        if (const ErrorCode failed = ImplicitQL(values, beside_.data(), n_, rotations).run())
+        RotationQueue rotations(withVectors ? PartsOf(matrix_) : RealMatrix());
+        if (const ErrorCode failed = ImplicitQL(values, beside_, rotations).run())
             return failed;
 
-        sort(values, order.data());
+        sort(values, order);
         for (int32_t i = 0; withVectors && i < n_; ++i)
-            CopyTransposed<E>(at(order[i]), 0, 1, n_, vectors + i, n_);
+            CopyTransposed<E>(matrix_.block(order[i], 0, 1, n_), vectors.block(0, i, n_, 1));
         for (int32_t i = 0; exponent != 0 && i < n_; ++i)
             values[i] = std::ldexp(values[i], exponent);
         return 0;
     }
 
 private:
-    T *at(int32_t row) const { return matrix_.data() + row * stride_; }
-    T *kappa() const { return vectors_.data(); }
-    T *product() const { return vectors_.data() + n_; }
-    T *work() const { return vectors_.data() + 2 * n_; }
-
     // From the last row up: the reflection that clears row i but for the element beside the
     // diagonal acts on the leading block of order i. Row i keeps its vector.
-    void reduce(DBL *diagonal) {
+    void reduce(RealVector diagonal) {
         for (int32_t i = n_ - 1; i > 0; --i) {
-            T *const v = at(i);
+            T *const v = matrix_.row(i);
             diagonal[i] = RealPart(v[i]);
             for (int32_t j = 0; j < i; ++j)
                 v[j] = Conj(v[j]);
             const Reflection reflection(v + i - 1, -1, i, Reflection::Leave::Reduced);
-            kappa()[i] = reflection.kappa;
+            kappa_[i] = reflection.kappa;
             beside_[i - 1] = reflection.beta;
             if (AbsSum(reflection.kappa) != 0.0)
-                reflectBlock(i, v, reflection.kappa);
+                reflectBlock({v, i}, reflection.kappa);
         }
-        diagonal[0] = RealPart(at(0)[0]);
+        diagonal[0] = RealPart(matrix_(0, 0));
         beside_[n_ - 1] = 0.0;
     }
 
     // The leading block a of order n becomes h a h^H = a - v w^H - w v^H with w = a v / conj(kappa)
     // - v (v^H a v) / (2 |kappa|^2).
-    void reflectBlock(int32_t n, const T *v, typename ScalarOf<E>::type k) {
-        T *const w = product(), *const minusW = work(), *const minusV = work() + n;
-        T *const vConjugate = work() + 2 * n, *const wConjugate = work() + 3 * n;
-        RowProducts(matrix_.data(), stride_, n, n, v, w);
+    void reflectBlock(ConstVectorView<E> v, typename ScalarOf<E>::type k) {
+        const auto n = static_cast<int32_t>(v.size());
+        const VectorView<E> w = product_.part(0, n), minusW = work_.part(0, n),
+                            minusV = work_.part(n, n), vConjugate = work_.part(2 * n, n),
+                            wConjugate = work_.part(3 * n, n);
+        RowProducts<E>(matrix_.block(0, 0, n, n), v, w);
         double form = 0.0;
         for (int32_t j = 0; j < n; ++j)
             form += RealPart(Conj(v[j]) * w[j]);
@@ -164,24 +150,23 @@ private:
         constexpr int32_t together = 4; // rows stay in the cache for the second update
         for (int32_t i = 0; i < n; i += together) {
             const int32_t rows = std::min(together, n - i);
-            AddOuterProduct(at(i), stride_, rows, n, minusV + i, wConjugate);
-            AddOuterProduct(at(i), stride_, rows, n, minusW + i, vConjugate);
+            const MatrixView<E> block = matrix_.block(i, 0, rows, n);
+            AddOuterProduct<E>(block, minusV.part(i, rows), wConjugate);
+            AddOuterProduct<E>(block, minusW.part(i, rows), vConjugate);
         }
     }
 
     // The matrix becomes the transposed product of the reflections.
     void accumulate() {
-        T *const q = basis_.data();
-        for (int32_t i = 0; i < n_; ++i)
-            for (int32_t j = 0; j < n_; ++j)
-                q[i * stride_ + j] = ScalarOf<E>::Of(i == j ? 1.0 : 0.0);
+        SetIdentity<E>(basis_);
         for (int32_t i = 1; i < n_; ++i)
-            ReflectFromLeft<E>(q, stride_, i, i, at(i), Conj(kappa()[i]), work());
-        CopyTransposed<E>(q, stride_, n_, n_, matrix_.data(), stride_);
+            ReflectFromLeft<E>(basis_.block(0, 0, i, i), {matrix_.row(i), i}, Conj(kappa_[i]),
+                               work_);
+        CopyTransposed<E>(basis_, matrix_);
     }
 
     // Exchange sort, ascending.
-    void sort(DBL *values, I32 *order) const {
+    void sort(RealVector values, IndexVector order) const {
         for (int32_t i = 0; i < n_; ++i)
             order[i] = i;
         for (int32_t i = 0; i < n_; ++i)
@@ -192,31 +177,24 @@ private:
                 }
     }
 
-    int32_t n_;
-    std::ptrdiff_t stride_;
-    Scratch<E> matrix_, basis_, vectors_;
-    Scratch<ElementType::DBL> beside_;
+    int32_t n_ = 0;
+    ScratchParts memory_;
+    MatrixView<E> matrix_, basis_;
+    VectorView<E> kappa_, product_, work_;
+    RealVector beside_;
 };
-
-template <ElementType E>
-ErrorCode Solve(const ElementOf<E> *a, int32_t n, int32_t output, DBL *values,
-                ElementOf<E> *vectors) {
-    if (n < 1)
-        return ErrEmptyInput;
-    if (output != eigenValuesOnly && output != eigenValuesAndVectors)
-        return ErrInvalidSelector;
-    if (CheckFinite(a, int64_t{n} * n) != 0)
-        return ErrNonFiniteInput;
-    return SymmetricProblem<E>(n).solve(a, output == eigenValuesAndVectors, values, vectors);
-}
 
 } // namespace
 
-ErrorCode SymmetricEigen(const DBL *a, int32_t n, int32_t output, DBL *values, DBL *vectors) {
-    return Solve<ElementType::DBL>(a, n, output, values, vectors);
+template <ElementType E>
+ErrorCode SymmetricEigen(ConstMatrixView<E> a, RealVector values, MatrixView<E> vectors) {
+    QX_EXPECTS(a.isSquare() && !a.isEmpty() && values.size() == a.rows());
+    if (!AllFinite<E>(a))
+        return ErrNonFiniteInput;
+    return SymmetricProblem<E>().solve(a, values, vectors);
 }
-ErrorCode SymmetricEigen(const CDB *a, int32_t n, int32_t output, DBL *values, CDB *vectors) {
-    return Solve<ElementType::CDB>(a, n, output, values, vectors);
-}
+
+template ErrorCode SymmetricEigen(ConstRealMatrix, RealVector, RealMatrix);
+template ErrorCode SymmetricEigen(ConstComplexMatrix, RealVector, ComplexMatrix);
 
 } // namespace qx

@@ -2,7 +2,7 @@
 
 #include "linalg/equations/schur_factors.h"
 #include "linalg/equations/triangular_equation.h"
-#include "linalg/transpose.h"
+#include "linalg/products/products.h"
 
 #include <algorithm>
 #include <cmath>
@@ -28,25 +28,20 @@ private:
     double factor_;
 };
 
-// A given matrix, row after row, and the power of two that brings its largest element to between
-// 0.5 and 1. For a matrix of zeros the exponent is 0.
+// A given matrix, and the power of two that brings its largest element to between 0.5 and 1. For a
+// matrix of zeros the exponent is 0.
 template <ElementType E>
 struct Given {
-    typedef ElementOf<E> T;
-
-    Given(const T *elements, int32_t rowCount, int32_t colCount, bool isNegated)
-        : data(elements), rows(rowCount), cols(colCount), negated(isNegated) {}
+    Given(ConstMatrixView<E> matrix, bool isNegated) : elements(matrix), negated(isNegated) {}
 
     // ErrNonFiniteInput.
     ErrorCode findExponent() {
-        const int64_t count = int64_t{rows} * cols;
         double largest = 0.0;
         bool isFinite = true;
-        for (int64_t i = 0; i < count; ++i) {
-            const double size = LargerPart(data[i]);
+        for (const ElementOf<E> &element : elements.elements()) {
             isFinite =
-                isFinite && std::isfinite(RealPart(data[i])) && std::isfinite(ImagPart(data[i]));
-            largest = std::max(largest, size);
+                isFinite && std::isfinite(RealPart(element)) && std::isfinite(ImagPart(element));
+            largest = std::max(largest, LargerPart(element));
         }
         if (!isFinite)
             return ErrNonFiniteInput;
@@ -56,51 +51,49 @@ struct Given {
         return 0;
     }
     // The scaled matrix times 2^further.
-    void copyTo(Part<T> to, int further = 0) const {
+    void copyTo(MatrixView<E> to, int further = 0) const {
         const PowerOfTwo scale(further - exponent);
-        for (int32_t i = 0; i < rows; ++i)
-            for (int32_t j = 0; j < cols; ++j) {
-                const auto element = scale.times(data[int64_t{i} * cols + j]);
-                to.data[i * to.stride + j] = negated ? -element : element;
+        for (int32_t i = 0; i < elements.rows(); ++i)
+            for (int32_t j = 0; j < elements.cols(); ++j) {
+                const auto element = scale.times(elements(i, j));
+                to(i, j) = negated ? -element : element;
             }
     }
 
-    const T *data;
-    int32_t rows, cols;
+    ConstMatrixView<E> elements;
     bool negated;
     bool isZero = true;
     int exponent = 0;
 };
 
-template <class T>
-double FrobeniusNorm(Part<T> a, int32_t rows, int32_t cols) {
+template <ElementType E>
+double FrobeniusNorm(ConstMatrixView<E> a) {
     double squares = 0.0;
-    for (int32_t i = 0; i < rows; ++i)
-        for (int32_t j = 0; j < cols; ++j)
-            squares += SquaredModulus(a.data[i * a.stride + j]);
+    for (int32_t i = 0; i < a.rows(); ++i)
+        for (int32_t j = 0; j < a.cols(); ++j)
+            squares += SquaredModulus(a(i, j));
     return std::sqrt(squares);
 }
 
-template <class T>
-void AdjointInPlace(Part<T> a, int32_t n) {
-    for (int32_t i = 0; i < n; ++i)
+template <ElementType E>
+void AdjointInPlace(MatrixView<E> a) {
+    for (int32_t i = 0; i < a.rows(); ++i)
         for (int32_t j = 0; j <= i; ++j) {
-            typename Part<T>::Element *const below = a.data + i * a.stride + j;
-            typename Part<T>::Element *const above = a.data + j * a.stride + i;
-            const auto held = Conj(*below);
-            *below = Conj(*above);
-            *above = held;
+            const auto held = Conj(a(i, j));
+            a(i, j) = Conj(a(j, i));
+            a(j, i) = held;
         }
 }
 
 template <ElementType E>
-void Scale(const SchurFactors<E> &factors, int32_t n, int exponent) {
+void Scale(const SchurFactors<E> &factors, int exponent) {
     if (exponent == 0)
         return;
     const PowerOfTwo scale(exponent);
-    for (int32_t i = 0; i < n; ++i) {
-        for (int32_t j = 0; j < n; ++j)
-            *factors.t().at(i, j) = scale.times(*factors.t().at(i, j));
+    const MatrixView<E> t = factors.t();
+    for (int32_t i = 0; i < t.rows(); ++i) {
+        for (int32_t j = 0; j < t.cols(); ++j)
+            t(i, j) = scale.times(t(i, j));
         factors.values()[i] = scale.times(factors.values()[i]);
     }
 }
@@ -109,13 +102,12 @@ void Scale(const SchurFactors<E> &factors, int32_t n, int exponent) {
 // of b, and a is given for b as well.
 template <ElementType E>
 class EquationSolver {
-    typedef ElementOf<E> T;
-
 public:
     EquationSolver(Given<E> a, Given<E> b, Given<E> c, bool products, bool lyapunov)
-        : a_(a), b_(b), c_(c), m_(a.rows), n_(b.rows), products_(products), lyapunov_(lyapunov) {}
+        : a_(a), b_(b), c_(c), m_(a.elements.rows()), n_(b.elements.rows()), products_(products),
+          lyapunov_(lyapunov) {}
 
-    ErrorCode solve(T *x) {
+    ErrorCode solve(MatrixView<E> x) {
         for (Given<E> *given : {&a_, &b_, &c_})
             if (const ErrorCode bad = given->findExponent())
                 return bad;
@@ -126,7 +118,7 @@ public:
         scaleTogether();
         if (isSingular())
             return ErrSingularMatrix;
-        c_.copyTo(PartOf(solution_));
+        c_.copyTo(solution_);
         growth_ = solveFactored(solution_);
         if (products_)
             refine();
@@ -137,18 +129,19 @@ public:
 
 private:
     ErrorCode allocate() {
-        for (const ErrorCode failed :
-             {sFactors_.allocate(m_), tFactors_.allocate(n_),
-              square_.allocate(std::max(m_, n_), std::max(m_, n_)), solution_.allocate(m_, n_),
-              work_.allocate(m_, n_), products_ ? correction_.allocate(m_, n_) : 0})
-            if (failed != 0)
-                return failed;
-        return 0;
+        const int32_t larger = std::max(m_, n_), correctionRows = products_ ? m_ : 0;
+        if (const ErrorCode failed = sFactors_.allocate(m_))
+            return failed;
+        if (const ErrorCode failed = tFactors_.allocate(n_))
+            return failed;
+        return memory_.take(SizedPadded(square_, larger, larger), SizedPadded(solution_, m_, n_),
+                            SizedPadded(work_, m_, n_),
+                            SizedPadded(correction_, correctionRows, n_));
     }
 
     ErrorCode factor() {
-        a_.copyTo(PartOf(sFactors_.t()));
-        aNorm_ = FrobeniusNorm(PartOf(sFactors_.t()), m_, m_);
+        a_.copyTo(sFactors_.t());
+        aNorm_ = FrobeniusNorm<E>(sFactors_.t());
         if (const ErrorCode failed = sFactors_.compute(aNorm_))
             return failed;
         if (lyapunov_) {
@@ -156,8 +149,8 @@ private:
             bNorm_ = aNorm_;
             return 0;
         }
-        b_.copyTo(PartOf(tFactors_.t()));
-        bNorm_ = FrobeniusNorm(PartOf(tFactors_.t()), n_, n_);
+        b_.copyTo(tFactors_.t());
+        bNorm_ = FrobeniusNorm<E>(tFactors_.t());
         return tFactors_.compute(bNorm_);
     }
 
@@ -177,8 +170,8 @@ private:
             aExponent_ = a_.isZero ? 0 : a_.exponent - equationExponent_;
             bExponent = b_.isZero ? 0 : b_.exponent - equationExponent_;
         }
-        Scale(sFactors_, m_, aExponent_);
-        Scale(tFactors_, n_, bExponent);
+        Scale(sFactors_, aExponent_);
+        Scale(tFactors_, bExponent);
         aNorm_ = std::ldexp(aNorm_, aExponent_);
         bNorm_ = std::ldexp(bNorm_, bExponent);
         norm_ = products_ ? aNorm_ * bNorm_ + tau_ : aNorm_ + bNorm_;
@@ -196,21 +189,22 @@ private:
         return false;
     }
 
-    // The right side in the panel becomes the solution, divided by the power of two whose exponent
-    // is returned.
-    int solveFactored(const Panel<E> &panel) const {
-        const Part<T> c = PartOf(panel), work = PartOf(work_), square = PartOf(square_);
-        const Part<T> zA = PartOf(sFactors_.adjoint()), zB = PartOf(tFactors_.adjoint());
-        Multiply(m_, n_, m_, zA, c, work);
-        CopyAdjoint<E>(zB, n_, square);
-        Multiply(m_, n_, n_, work, square, c);
-        const TriangularEquation<E> equation = {
-            m_,        n_,   PartOf(sFactors_.t()), PartOf(tFactors_.t()),
-            products_, tau_, epsilon / 4.0 * norm_};
-        const int growth = SolveTriangularEquation(equation, c, work);
-        Multiply(m_, n_, n_, c, zB, work);
-        CopyAdjoint<E>(zA, m_, square);
-        Multiply(m_, n_, m_, square, work, c);
+    // A square matrix for what is needed in between.
+    MatrixView<E> square(int32_t n) const { return square_.block(0, 0, n, n); }
+
+    // The right side c becomes the solution, divided by the power of two whose exponent is
+    // returned.
+    int solveFactored(MatrixView<E> c) const {
+        const ConstMatrixView<E> zA = sFactors_.adjoint(), zB = tFactors_.adjoint();
+        OrderedProduct<E>(zA, c, work_);
+        CopyAdjoint<E>(zB, square(n_));
+        OrderedProduct<E>(work_, square(n_), c);
+        const TriangularEquation<E> equation = {sFactors_.t(), tFactors_.t(), products_, tau_,
+                                                epsilon / 4.0 * norm_};
+        const int growth = SolveTriangularEquation<E>(equation, c, work_);
+        OrderedProduct<E>(c, zB, work_);
+        CopyAdjoint<E>(zA, square(m_));
+        OrderedProduct<E>(square(m_), work_, c);
         return growth;
     }
 
@@ -220,31 +214,28 @@ private:
     void refine() const {
         if (growth_ != 0)
             return;
-        const Part<T> x = PartOf(solution_), residual = PartOf(correction_),
-                      square = PartOf(square_), work = PartOf(work_);
-        b_.copyTo(square);
+        b_.copyTo(square(n_));
         if (lyapunov_)
-            AdjointInPlace(square, n_);
-        Multiply(m_, n_, n_, x, square, work);
-        a_.copyTo(square, aExponent_);
-        c_.copyTo(residual);
-        Subtract(m_, n_, m_, square, work, residual);
+            AdjointInPlace<E>(square(n_));
+        OrderedProduct<E>(solution_, square(n_), work_);
+        a_.copyTo(square(m_), aExponent_);
+        c_.copyTo(correction_); // from here on the residual, and then the solution for it
+        SubtractProduct<E>(square(m_), work_, correction_);
         for (int32_t i = 0; i < m_; ++i)
             for (int32_t j = 0; j < n_; ++j)
-                *correction_.at(i, j) += *solution_.at(i, j) * tau_;
-        const double size = FrobeniusNorm(x, m_, n_);
-        if (solveFactored(correction_) != 0 || !(FrobeniusNorm(residual, m_, n_) < 0.25 * size))
+                correction_(i, j) += solution_(i, j) * tau_;
+        const double size = FrobeniusNorm<E>(solution_);
+        if (solveFactored(correction_) != 0 || !(FrobeniusNorm<E>(correction_) < 0.25 * size))
             return;
         for (int32_t i = 0; i < m_; ++i)
             for (int32_t j = 0; j < n_; ++j)
-                *solution_.at(i, j) += *correction_.at(i, j);
+                solution_(i, j) += correction_(i, j);
     }
 
     bool isHermitian() const {
         for (int32_t i = 0; i < n_; ++i)
             for (int32_t j = 0; j <= i; ++j) {
-                const auto upper = c_.data[int64_t{j} * n_ + i],
-                           lower = Conj(c_.data[int64_t{i} * n_ + j]);
+                const auto upper = c_.elements(j, i), lower = Conj(c_.elements(i, j));
                 if (RealPart(upper) != RealPart(lower) || ImagPart(upper) != ImagPart(lower))
                     return false;
             }
@@ -253,21 +244,21 @@ private:
     void makeHermitian() const {
         for (int32_t i = 0; i < n_; ++i)
             for (int32_t j = 0; j <= i; ++j) {
-                const auto mean = *solution_.at(i, j) * 0.5 + Conj(*solution_.at(j, i)) * 0.5;
-                *solution_.at(j, i) = Conj(mean);
-                *solution_.at(i, j) = mean;
+                const auto mean = solution_(i, j) * 0.5 + Conj(solution_(j, i)) * 0.5;
+                solution_(j, i) = Conj(mean);
+                solution_(i, j) = mean;
             }
     }
 
-    ErrorCode writeTo(T *x) const {
+    ErrorCode writeTo(MatrixView<E> x) const {
         const PowerOfTwo scale(c_.exponent - equationExponent_ + growth_);
         bool isFinite = true;
         for (int32_t i = 0; i < m_; ++i)
             for (int32_t j = 0; j < n_; ++j) {
-                const auto value = scale.times(*solution_.at(i, j));
+                const auto value = scale.times(solution_(i, j));
                 isFinite =
                     isFinite && std::isfinite(RealPart(value)) && std::isfinite(ImagPart(value));
-                x[int64_t{i} * n_ + j] = value;
+                x(i, j) = value;
             }
         return isFinite ? 0 : ErrOverflow;
     }
@@ -276,48 +267,40 @@ private:
     int32_t m_, n_;
     bool products_, lyapunov_;
     SchurFactors<E> sFactors_, tFactors_;
-    Panel<E> square_, solution_, work_, correction_;
+    ScratchParts memory_;
+    MatrixView<E> square_, solution_, work_, correction_;
     double aNorm_ = 0.0, bNorm_ = 0.0, norm_ = 0.0, tau_ = 1.0;
     int aExponent_ = 0; // the scaled a is still multiplied by this power of two
     int equationExponent_ = 0, growth_ = 0;
 };
 
-template <ElementType E>
-ErrorCode Sylvester(const ElementOf<E> *a, int32_t m, const ElementOf<E> *b, int32_t n,
-                    const ElementOf<E> *c, int32_t equation, ElementOf<E> *x) {
-    if (equation < sylvesterSum || equation > sylvesterProducts)
-        return ErrInvalidSelector;
-    return EquationSolver<E>({a, m, m, false}, {b, n, n, equation == sylvesterDifference},
-                             {c, m, n, false}, equation == sylvesterProducts, false)
-        .solve(x);
-}
-
-template <ElementType E>
-ErrorCode Lyapunov(const ElementOf<E> *a, int32_t n, const ElementOf<E> *q, int32_t equation,
-                   ElementOf<E> *x) {
-    if (equation != lyapunovContinuous && equation != lyapunovDiscrete)
-        return ErrInvalidSelector;
-    const bool isDiscrete = equation == lyapunovDiscrete;
-    return EquationSolver<E>({a, n, n, false}, {a, n, n, false}, {q, n, n, isDiscrete}, isDiscrete,
-                             true)
-        .solve(x);
-}
-
 } // namespace
 
-ErrorCode SolveSylvester(const DBL *a, int32_t m, const DBL *b, int32_t n, const DBL *c,
-                         int32_t equation, DBL *x) {
-    return Sylvester<ElementType::DBL>(a, m, b, n, c, equation, x);
+template <ElementType E>
+ErrorCode SolveSylvester(ConstMatrixView<E> a, ConstMatrixView<E> b, ConstMatrixView<E> c,
+                         SylvesterEquation equation, MatrixView<E> x) {
+    QX_EXPECTS(a.isSquare() && b.isSquare() && c.rows() == a.rows() && c.cols() == b.rows());
+    QX_EXPECTS(!c.isEmpty() && x.rows() == c.rows() && x.cols() == c.cols());
+    return EquationSolver<E>({a, false}, {b, equation == sylvesterDifference}, {c, false},
+                             equation == sylvesterProducts, false)
+        .solve(x);
 }
-ErrorCode SolveSylvester(const CDB *a, int32_t m, const CDB *b, int32_t n, const CDB *c,
-                         int32_t equation, CDB *x) {
-    return Sylvester<ElementType::CDB>(a, m, b, n, c, equation, x);
+
+template <ElementType E>
+ErrorCode SolveLyapunov(ConstMatrixView<E> a, ConstMatrixView<E> q, LyapunovEquation equation,
+                        MatrixView<E> x) {
+    QX_EXPECTS(a.isSquare() && !a.isEmpty() && q.isSquare() && q.rows() == a.rows());
+    QX_EXPECTS(x.isSquare() && x.rows() == a.rows());
+    const bool isDiscrete = equation == lyapunovDiscrete;
+    return EquationSolver<E>({a, false}, {a, false}, {q, isDiscrete}, isDiscrete, true).solve(x);
 }
-ErrorCode SolveLyapunov(const DBL *a, int32_t n, const DBL *q, int32_t equation, DBL *x) {
-    return Lyapunov<ElementType::DBL>(a, n, q, equation, x);
-}
-ErrorCode SolveLyapunov(const CDB *a, int32_t n, const CDB *q, int32_t equation, CDB *x) {
-    return Lyapunov<ElementType::CDB>(a, n, q, equation, x);
-}
+
+template ErrorCode SolveSylvester(ConstRealMatrix, ConstRealMatrix, ConstRealMatrix,
+                                  SylvesterEquation, RealMatrix);
+template ErrorCode SolveSylvester(ConstComplexMatrix, ConstComplexMatrix, ConstComplexMatrix,
+                                  SylvesterEquation, ComplexMatrix);
+template ErrorCode SolveLyapunov(ConstRealMatrix, ConstRealMatrix, LyapunovEquation, RealMatrix);
+template ErrorCode SolveLyapunov(ConstComplexMatrix, ConstComplexMatrix, LyapunovEquation,
+                                 ComplexMatrix);
 
 } // namespace qx

@@ -1,7 +1,7 @@
 #ifndef QX_LINALG_EQUATIONS_MATRIX_EQUATIONS_H
 #define QX_LINALG_EQUATIONS_MATRIX_EQUATIONS_H
 
-#include "qx/types.h"
+#include "linalg/matrix.h"
 
 namespace qx {
 
@@ -19,19 +19,17 @@ enum LyapunovEquation : int32_t {
 // Through the Schur forms of a and b and back substitution by blocks (R. H. Bartels and G. W.
 // Stewart, 1972; for the products J. D. Gardiner, A. J. Laub, J. J. Amato and C. B. Moler,
 // "Solution of the Sylvester matrix equation AXB^T + CXD^T = E", 1992). Scaled by powers of two so
-// that nothing overflows but the result; with products, one
-// step of iterative refinement.
+// that nothing overflows but the result; with products, one step of iterative refinement.
 //
-// ErrInvalidSelector, ErrNonFiniteInput, ErrIterationLimit, ErrSingularMatrix, ErrOverflow,
-// ErrOutOfMemory.
-ErrorCode SolveSylvester(const DBL *a, int32_t m, const DBL *b, int32_t n, const DBL *c,
-                         int32_t equation, DBL *x);
-ErrorCode SolveSylvester(const CDB *a, int32_t m, const CDB *b, int32_t n, const CDB *c,
-                         int32_t equation, CDB *x);
+// ErrNonFiniteInput, ErrIterationLimit, ErrSingularMatrix, ErrOverflow, ErrOutOfMemory.
+template <ElementType E>
+ErrorCode SolveSylvester(ConstMatrixView<E> a, ConstMatrixView<E> b, ConstMatrixView<E> c,
+                         SylvesterEquation equation, MatrixView<E> x);
 
-// All n by n; x is Hermitian to the bit where q is.
-ErrorCode SolveLyapunov(const DBL *a, int32_t n, const DBL *q, int32_t equation, DBL *x);
-ErrorCode SolveLyapunov(const CDB *a, int32_t n, const CDB *q, int32_t equation, CDB *x);
+// All of one order; x is Hermitian to the bit where q is.
+template <ElementType E>
+ErrorCode SolveLyapunov(ConstMatrixView<E> a, ConstMatrixView<E> q, LyapunovEquation equation,
+                        MatrixView<E> x);
 
 } // namespace qx
 

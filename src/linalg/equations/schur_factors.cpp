@@ -3,62 +3,60 @@
 #include "linalg/eigenproblems/complex_qr.h"
 #include "linalg/eigenproblems/real_qr.h"
 #include "linalg/factorisations/hessenberg.h"
-#include "linalg/transpose.h"
 
 namespace qx {
 
+namespace {
+
 template <ElementType E>
-void CopyAdjoint(Part<ElementOf<E>> from, int32_t n, Part<ElementOf<E>> to) {
-    CopyTransposed<E>(from.data, from.stride, n, n, to.data, to.stride);
-    for (int32_t i = 0; E == ElementType::CDB && i < n; ++i)
-        for (int32_t j = 0; j < n; ++j)
-            to.data[i * to.stride + j] = Conj(to.data[i * to.stride + j]);
+void ConjugateInPlace(MatrixView<E> a) {
+    for (int32_t i = 0; E == ElementType::CDB && i < a.rows(); ++i)
+        for (int32_t j = 0; j < a.cols(); ++j)
+            a(i, j) = Conj(a(i, j));
+}
+
+} // namespace
+
+template <ElementType E>
+void CopyAdjoint(ConstMatrixView<E> from, MatrixView<E> to) {
+    CopyTransposed<E>(from, to);
+    ConjugateInPlace<E>(to);
 }
 
 template <ElementType E>
 ErrorCode SchurFactors<E>::allocate(int32_t n) {
     n_ = n;
-    if (const ErrorCode failed = t_.allocate(n, n))
-        return failed;
-    if (const ErrorCode failed = adjoint_.allocate(n, n))
-        return failed;
-    return values_.allocate(n);
+    return memory_.take(SizedPadded(t_, n, n), SizedPadded(adjoint_, n, n), Sized(values_, n));
 }
 
 template <ElementType E>
 ErrorCode SchurFactors<E>::compute(double norm) {
-    Panel<E> z;
-    Scratch<ElementType::DBL> exchanges;
-    if (const ErrorCode failed = z.allocate(n_, n_))
-        return failed;
-    if (const ErrorCode failed = exchanges.allocate(n_))
+    MatrixView<E> z;
+    RealVector exchanges;
+    ScratchParts memory;
+    if (const ErrorCode failed = memory.take(SizedPadded(z, n_, n_), Sized(exchanges, n_)))
         return failed;
     // Permutations alone: factors would spoil the backward stability.
-    const Balanced range = Balance<E>(t_.data(), t_.stride(), n_, true, false, exchanges.data());
-    if (const ErrorCode failed = ReduceToHessenberg<E>(t_.data(), t_.stride(), n_, range.low,
-                                                       range.high, z.data(), z.stride()))
+    const Balanced range = Balance<E>(t_, true, false, exchanges);
+    if (const ErrorCode failed = ReduceToHessenberg<E>(t_, range.low, range.high, z))
         return failed;
-    UndoPermutation<E>(exchanges.data(), range, n_, z.data(), z.stride(), n_);
-    CopyTransposed<E>(z.data(), z.stride(), n_, n_, adjoint_.data(), adjoint_.stride());
+    UndoPermutation<E>(exchanges, range, z);
+    CopyTransposed<E>(z, adjoint_);
     // Each element that is dropped counts a little; all together they stay within the norm's eps.
     if (const ErrorCode failed = iterate(range, epsilon / 16.0 * norm))
         return failed;
     clearBelowDiagonal();
-    for (int32_t i = 0; E == ElementType::CDB && i < n_; ++i)
-        for (int32_t j = 0; j < n_; ++j)
-            *adjoint_.at(i, j) = Conj(*adjoint_.at(i, j));
+    ConjugateInPlace<E>(adjoint_);
     return 0;
 }
 
 template <>
 ErrorCode SchurFactors<ElementType::DBL>::iterate(Balanced range, double negligible) {
-    return RealSchurIteration(t_.data(), t_.stride(), n_, range, negligible, values(),
-                              adjoint_.data());
+    return RealSchurIteration(t_, range, negligible, values_, adjoint_);
 }
 template <>
 ErrorCode SchurFactors<ElementType::CDB>::iterate(Balanced range, double negligible) {
-    return ComplexSchurIteration(t_.data(), t_.stride(), n_, range, negligible, values(),
-                                 adjoint_.data());
+    return ComplexSchurIteration(t_, range, negligible, values_, adjoint_);
 }
 
 template <ElementType E>
@@ -66,7 +64,7 @@ void SchurFactors<E>::clearBelowDiagonal() {
     for (int32_t i = 1; i < n_; ++i) {
         const bool isPair = E == ElementType::DBL && values_[i].im < 0.0;
         for (int32_t j = 0; j < (isPair ? i - 1 : i); ++j)
-            *t_.at(i, j) = T{};
+            t_(i, j) = {};
     }
 }
 
@@ -75,15 +73,15 @@ void SchurFactors<E>::setAdjoint(const SchurFactors &a) {
     for (int32_t i = 0; i < n_; ++i) {
         const int32_t mirror = n_ - 1 - i;
         for (int32_t j = 0; j < n_; ++j) {
-            *t_.at(i, j) = Conj(*a.t_.at(n_ - 1 - j, mirror));
-            *adjoint_.at(i, j) = *a.adjoint_.at(mirror, j);
+            t_(i, j) = Conj(a.t_(n_ - 1 - j, mirror));
+            adjoint_(i, j) = a.adjoint_(mirror, j);
         }
         values_[i] = Conj(a.values_[mirror]);
     }
 }
 
-template void CopyAdjoint<ElementType::DBL>(Part<DBL>, int32_t, Part<DBL>);
-template void CopyAdjoint<ElementType::CDB>(Part<CDB>, int32_t, Part<CDB>);
+template void CopyAdjoint(ConstRealMatrix, RealMatrix);
+template void CopyAdjoint(ConstComplexMatrix, ComplexMatrix);
 template class SchurFactors<ElementType::DBL>;
 template class SchurFactors<ElementType::CDB>;
 

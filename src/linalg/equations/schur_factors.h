@@ -1,7 +1,6 @@
 #ifndef QX_LINALG_EQUATIONS_SCHUR_FACTORS_H
 #define QX_LINALG_EQUATIONS_SCHUR_FACTORS_H
 
-#include "linalg/equations/panel.h"
 #include "linalg/factorisations/balance.h"
 
 namespace qx {
@@ -12,8 +11,6 @@ namespace qx {
 // converge for it. t has exact zeros below its diagonal, blocks of two aside.
 template <ElementType E>
 class SchurFactors {
-    typedef ElementOf<E> T;
-
 public:
     // t() is a matrix of order n whose largest element is about 1, and becomes its Schur form.
     // ErrOutOfMemory from either, ErrIterationLimit from compute().
@@ -23,22 +20,23 @@ public:
     // keeps it upper triangular.
     void setAdjoint(const SchurFactors &a);
 
-    const Panel<E> &t() const { return t_; }
-    const Panel<E> &adjoint() const { return adjoint_; } // z^H
-    CDB *values() const { return values_.data(); }
+    MatrixView<E> t() const { return t_; }
+    ConstMatrixView<E> adjoint() const { return adjoint_; } // z^H
+    ComplexVector values() const { return values_; }
 
 private:
     ErrorCode iterate(Balanced range, double negligible);
     void clearBelowDiagonal();
 
     int32_t n_ = 0;
-    Panel<E> t_, adjoint_;
-    Scratch<ElementType::CDB> values_;
+    ScratchParts memory_;
+    MatrixView<E> t_, adjoint_;
+    ComplexVector values_;
 };
 
-// to = from^H for an n by n matrix.
+// to = from^H.
 template <ElementType E>
-void CopyAdjoint(Part<ElementOf<E>> from, int32_t n, Part<ElementOf<E>> to);
+void CopyAdjoint(ConstMatrixView<E> from, MatrixView<E> to);
 
 } // namespace qx
 

@@ -1,5 +1,7 @@
 #include "linalg/equations/triangular_equation.h"
 
+#include "linalg/products/products.h"
+
 #include <algorithm>
 #include <cmath>
 #include <utility>
@@ -62,11 +64,11 @@ class Substitution {
     typedef typename ScalarOf<E>::type Value;
 
 public:
-    Substitution(const TriangularEquation<E> &equation, Part<T> f, Part<T> work)
+    Substitution(const TriangularEquation<E> &equation, MatrixView<E> f, MatrixView<E> work)
         : equation_(equation), f_(f), work_(work) {}
 
     int run() {
-        solve({0, equation_.m}, {0, equation_.n});
+        solve({0, f_.rows()}, {0, f_.cols()});
         return exponent_;
     }
 
@@ -76,21 +78,20 @@ private:
         int32_t size() const { return to - from; }
     };
 
-    static Part<T> part(Part<T> whole, int32_t i, int32_t j) {
-        return {whole.data + i * whole.stride + j, whole.stride};
-    }
-    static T &element(Part<T> whole, int32_t i, int32_t j) {
-        return whole.data[i * whole.stride + j];
+    template <bool Writable>
+    static BasicMatrixView<E, Writable> part(BasicMatrixView<E, Writable> whole, Range rows,
+                                             Range cols) {
+        return whole.block(rows.from, cols.from, rows.size(), cols.size());
     }
 
     // Whether rows i - 1 and i of s or t belong to one block.
-    static bool isInPair(Part<T> triangle, int32_t i) {
-        return E == ElementType::DBL && AbsSum(element(triangle, i, i - 1)) != 0.0;
+    static bool isInPair(ConstMatrixView<E> triangle, int32_t i) {
+        return E == ElementType::DBL && AbsSum(triangle(i, i - 1)) != 0.0;
     }
-    static bool isCell(Part<T> triangle, Range range) {
+    static bool isCell(ConstMatrixView<E> triangle, Range range) {
         return range.size() == 1 || (range.size() == 2 && isInPair(triangle, range.from + 1));
     }
-    static int32_t middle(Part<T> triangle, Range range) {
+    static int32_t middle(ConstMatrixView<E> triangle, Range range) {
         const int32_t i = range.from + range.size() / 2;
         return isInPair(triangle, i) ? i + 1 : i;
     }
@@ -109,15 +110,8 @@ private:
         const int32_t at = middle(equation_.t, cols);
         const Range left = {cols.from, at}, right = {at, cols.to};
         solve(rows, left);
-        const Part<T> y = part(f_, rows.from, left.from), f = part(f_, rows.from, right.from);
-        const Part<T> t = part(equation_.t, left.from, right.from);
-        const int32_t m = rows.size();
-        if (equation_.products) {
-            Multiply(m, right.size(), left.size(), y, t, work_);
-            Subtract(m, right.size(), m, part(equation_.s, rows.from, rows.from), work_, f);
-        } else {
-            Subtract(m, right.size(), left.size(), y, t, f);
-        }
+        subtractSolved(part(equation_.s, rows, rows), part(f_, rows, left),
+                       part(equation_.t, left, right), part(f_, rows, right), true);
         solve(rows, right);
     }
 
@@ -125,25 +119,32 @@ private:
         const int32_t at = middle(equation_.s, rows);
         const Range upper = {rows.from, at}, lower = {at, rows.to};
         solve(lower, cols);
-        const Part<T> y = part(f_, lower.from, cols.from), f = part(f_, upper.from, cols.from);
-        const Part<T> s = part(equation_.s, upper.from, lower.from);
-        const int32_t n = cols.size();
-        if (equation_.products) {
-            Multiply(lower.size(), n, n, y, part(equation_.t, cols.from, cols.from), work_);
-            Subtract(upper.size(), n, lower.size(), s, work_, f);
-        } else {
-            Subtract(upper.size(), n, lower.size(), s, y, f);
-        }
+        subtractSolved(part(equation_.s, upper, lower), part(f_, lower, cols),
+                       part(equation_.t, cols, cols), part(f_, upper, cols), false);
         solve(upper, cols);
+    }
+
+    // Takes from f what the solved part y adds to it: s y t, or of a sum y t or s y alone.
+    void subtractSolved(ConstMatrixView<E> s, ConstMatrixView<E> y, ConstMatrixView<E> t,
+                        MatrixView<E> f, bool throughT) {
+        if (equation_.products) {
+            const MatrixView<E> yt(work_.data(), y.rows(), t.cols(), work_.stride());
+            OrderedProduct<E>(y, t, yt);
+            SubtractProduct<E>(s, yt, f);
+        } else if (throughT) {
+            SubtractProduct<E>(y, t, f);
+        } else {
+            SubtractProduct<E>(s, y, f);
+        }
     }
 
     void solveCell(Range rows, Range cols) {
         if (rows.size() == 1 && cols.size() == 1) {
-            const Value s = element(equation_.s, rows.from, rows.from);
-            const Value t = element(equation_.t, cols.from, cols.from);
+            const Value s = equation_.s(rows.from, rows.from);
+            const Value t = equation_.t(cols.from, cols.from);
             const Value factor =
                 equation_.products ? s * t - ScalarOf<E>::Of(equation_.tau) : s + t;
-            T &y = element(f_, rows.from, cols.from);
+            T &y = f_(rows.from, cols.from);
             y = y / factor;
             limitGrowth(AbsSum(y));
         } else if constexpr (E == ElementType::DBL) {
@@ -154,15 +155,12 @@ private:
     void solvePairs(Range rows, Range cols) {
         const int r = rows.size(), c = cols.size();
         SmallSystem system = {r * c, {}, {}};
-        const auto s = [&](int i, int k) {
-            return element(equation_.s, rows.from + i, rows.from + k);
-        };
-        const auto t = [&](int l, int j) {
-            return element(equation_.t, cols.from + l, cols.from + j);
-        };
+        const ConstMatrixView<E> s = part(equation_.s, rows, rows);
+        const ConstMatrixView<E> t = part(equation_.t, cols, cols);
+        const MatrixView<E> f = part(f_, rows, cols);
         for (int i = 0; i < r; ++i)
             for (int j = 0; j < c; ++j) {
-                system.x[i * c + j] = element(f_, rows.from + i, cols.from + j);
+                system.x[i * c + j] = f(i, j);
                 for (int k = 0; k < r; ++k)
                     for (int l = 0; l < c; ++l)
                         system.a[i * c + j][k * c + l] =
@@ -174,7 +172,7 @@ private:
         double largest = 0.0;
         for (int i = 0; i < r; ++i)
             for (int j = 0; j < c; ++j) {
-                element(f_, rows.from + i, cols.from + j) = system.x[i * c + j];
+                f(i, j) = system.x[i * c + j];
                 largest = std::max(largest, std::fabs(system.x[i * c + j]));
             }
         limitGrowth(largest);
@@ -183,28 +181,29 @@ private:
     void limitGrowth(double size) {
         if (!(size > 0x1p500))
             return;
-        for (int32_t i = 0; i < equation_.m; ++i)
-            for (int32_t j = 0; j < equation_.n; ++j)
-                element(f_, i, j) = element(f_, i, j) * 0x1p-500;
+        for (int32_t i = 0; i < f_.rows(); ++i)
+            for (int32_t j = 0; j < f_.cols(); ++j)
+                f_(i, j) = f_(i, j) * 0x1p-500;
         exponent_ += growthLimit;
     }
 
     const TriangularEquation<E> &equation_;
-    Part<T> f_, work_;
+    MatrixView<E> f_, work_;
     int exponent_ = 0;
 };
 
 } // namespace
 
 template <ElementType E>
-int SolveTriangularEquation(const TriangularEquation<E> &equation, Part<ElementOf<E>> f,
-                            Part<ElementOf<E>> work) {
+int SolveTriangularEquation(const TriangularEquation<E> &equation, MatrixView<E> f,
+                            MatrixView<E> work) {
+    QX_EXPECTS(f.rows() == equation.s.rows() && f.cols() == equation.t.rows());
     return Substitution<E>(equation, f, work).run();
 }
 
-template int SolveTriangularEquation(const TriangularEquation<ElementType::DBL> &, Part<DBL>,
-                                     Part<DBL>);
-template int SolveTriangularEquation(const TriangularEquation<ElementType::CDB> &, Part<CDB>,
-                                     Part<CDB>);
+template int SolveTriangularEquation(const TriangularEquation<ElementType::DBL> &, RealMatrix,
+                                     RealMatrix);
+template int SolveTriangularEquation(const TriangularEquation<ElementType::CDB> &, ComplexMatrix,
+                                     ComplexMatrix);
 
 } // namespace qx

@@ -1,17 +1,16 @@
 #ifndef QX_LINALG_EQUATIONS_TRIANGULAR_EQUATION_H
 #define QX_LINALG_EQUATIONS_TRIANGULAR_EQUATION_H
 
-#include "linalg/equations/panel.h"
+#include "linalg/matrix.h"
 
 namespace qx {
 
-// s y + y t = f, or with `products` s y t - tau y = f, for upper triangular s (m by m) and t (n by
-// n); real ones may have blocks of two on the diagonal, where the element below it is not 0. The
-// elements of s and t are at most about 1.
+// s y + y t = f, or with `products` s y t - tau y = f, for upper triangular s and t; real ones may
+// have blocks of two on the diagonal, where the element below it is not 0. The elements of s and t
+// are at most about 1.
 template <ElementType E>
 struct TriangularEquation {
-    int32_t m, n;
-    Part<ElementOf<E>> s, t;
+    ConstMatrixView<E> s, t;
     bool products;
     double tau;
     // A pivot of the smallest systems that is below this is replaced by it.
@@ -22,10 +21,10 @@ struct TriangularEquation {
 // elements grow beyond 2^500. Back substitution by blocks, which halves the longer side until one
 // element or one block of two by two is left (R. H. Bartels and G. W. Stewart, "Solution of the
 // matrix equation AX + XB = C", 1972; the halving after I. Jonsson and B. Kagstrom, "Recursive
-// blocked algorithms for solving triangular systems", 2002). `work` is m by n.
+// blocked algorithms for solving triangular systems", 2002). `work` is as large as f.
 template <ElementType E>
-int SolveTriangularEquation(const TriangularEquation<E> &equation, Part<ElementOf<E>> f,
-                            Part<ElementOf<E>> work);
+int SolveTriangularEquation(const TriangularEquation<E> &equation, MatrixView<E> f,
+                            MatrixView<E> work);
 
 } // namespace qx
 

@@ -1,66 +1,68 @@
 #include "qx/eigenproblems.h"
 
-#include "frame/export.h"
 #include "linalg/eigenproblems/general.h"
 #include "linalg/eigenproblems/symmetric.h"
+#include "linalg/exports/checks.h"
 #include "linalg/factorisations/schur.h"
 
 namespace qx {
 namespace {
 
-// The vectors of an eigenproblem, if they are wanted.
-Outcome ResizeVectors(Out<CDB2D> &vectors, int32_t output, int32_t n) {
-    return output == eigenValuesAndVectors ? vectors.resize(n, n) : vectors.resize(0, 0);
-}
-
-// kept: of the exports with an `err`, the last failed check decides
-template <class Matrix>
-ErrorCode CheckSquare(const Block<Matrix> &a) {
-    return LastFailed({{a.isEmpty(), ErrEmptyInput}, {!a.isSquare(), ErrNotSquare}});
+bool IsNoOutput(int32_t output) {
+    return output != eigenValuesOnly && output != eigenValuesAndVectors;
 }
 
 Outcome Eigen(In<DBL2D> a, int32_t output, Out<CDB1D> values, Out<CDB2D> vectors) {
-    if (const ErrorCode bad = CheckSquare(a))
+    if (const ErrorCode bad = SquareLast(a))
         return bad;
     if (const Outcome bad = values.resize(a.rows()))
         return bad;
-    if (const Outcome bad = ResizeVectors(vectors, output, a.rows()))
+    if (const Outcome bad = ResizeIf(output == eigenValuesAndVectors, vectors, a.rows()))
         return bad;
-    return EigenGeneral(a.data(), a.rows(), output, values.data(), vectors.data());
+    if (IsNoOutput(output))
+        return ErrInvalidSelector;
+    return EigenGeneral<ElementType::DBL>(a.view(), values.view(), vectors.view());
 }
 
 Outcome CxEigen(In<CDB2D> a, int32_t matrixType, int32_t output, Out<CDB1D> values,
                 Out<CDB2D> vectors) {
-    if (const ErrorCode bad = CheckSquare(a))
+    if (const ErrorCode bad = SquareLast(a))
         return bad;
     if (const Outcome bad = values.resize(a.rows()))
         return bad;
-    if (const Outcome bad = ResizeVectors(vectors, output, a.rows()))
+    if (const Outcome bad = ResizeIf(output == eigenValuesAndVectors, vectors, a.rows()))
         return bad;
-    return CxEigenGeneral(a.data(), a.rows(), matrixType, output, values.data(), vectors.data());
+    if ((matrixType != generalMatrix && matrixType != hermitianMatrix) || IsNoOutput(output))
+        return ErrInvalidSelector;
+    if (matrixType == hermitianMatrix)
+        return EigenHermitian(a.view(), values.view(), vectors.view());
+    return EigenGeneral<ElementType::CDB>(a.view(), values.view(), vectors.view());
 }
 
 Outcome SymEigen(InOut<DBL2D> a, int32_t output, Out<DBL1D> values) {
-    if (const ErrorCode bad = CheckSquare(a))
+    if (const ErrorCode bad = SquareLast(a))
         return bad;
     if (const Outcome bad = values.resize(a.rows()))
         return bad;
-    return SymmetricEigen(a.data(), a.rows(), output, values.data(), a.data());
+    if (IsNoOutput(output))
+        return ErrInvalidSelector;
+    const RealMatrix vectors = output == eigenValuesAndVectors ? a.view() : RealMatrix();
+    return SymmetricEigen<ElementType::DBL>(a.view(), values.view(), vectors);
 }
 
 template <class Matrix>
 Outcome Schur(InOut<Matrix> a, bool withVectors, int32_t order, Out<Matrix> u, Out<CDB1D> w) {
     const int32_t n = a.rows();
-    if (const ErrorCode bad = FirstFailed(
-            {{a.isEmpty(), ErrEmptyInput},
-             {!a.isSquare(), ErrNotSquare},
-             {order < schurUnordered || order > schurModulusDescending, ErrInvalidSelector}}))
+    if (const ErrorCode bad = FirstFailed({{a.isEmpty(), ErrEmptyInput},
+                                           {!a.isSquare(), ErrNotSquare},
+                                           {IsNoSchurOrder(order), ErrInvalidSelector}}))
         return bad;
-    if (const Outcome bad = withVectors ? u.resize(n, n) : u.resize(0, 0))
+    if (const Outcome bad = ResizeIf(withVectors, u, n))
         return bad;
     if (const Outcome bad = w.resize(n))
         return bad;
-    return SchurDecompose(a.data(), n, order, withVectors ? u.data() : nullptr, a.data(), w.data());
+    return SchurDecompose<elementOf<Matrix>>(a.view(), SchurOrder{order}, u.view(), a.view(),
+                                             w.view());
 }
 
 } // namespace

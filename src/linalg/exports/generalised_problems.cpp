@@ -1,10 +1,8 @@
 #include "qx/generalised_problems.h"
 
-#include "frame/export.h"
 #include "linalg/eigenproblems/general.h"
 #include "linalg/eigenproblems/generalised.h"
-#include "linalg/factorisations/schur.h"
-#include "linalg/scalar.h"
+#include "linalg/exports/checks.h"
 
 #include <limits>
 
@@ -18,67 +16,65 @@ ErrorCode CheckPencil(const Block<Matrix> &a, const Block<Matrix> &b) {
                         {a.rows() != b.rows() || a.cols() != b.cols(), ErrBandVectorSize}});
 }
 
-template <class Matrix>
-Outcome ResizeIf(bool wanted, Out<Matrix> &matrix, int32_t n) {
-    return wanted ? matrix.resize(n, n) : matrix.resize(0, 0);
-}
-
 // The order is checked before the outputs grow, and so before anything is computed.
-template <class Matrix, class Vector>
-Outcome QZ(InOut<Matrix> a, InOut<Matrix> b, bool withVectors, int32_t order, Out<Matrix> q,
-           Out<Matrix> z, Out<CDB1D> alpha, Out<Vector> beta) {
-    const int32_t n = a.rows();
+template <class Matrix>
+ErrorCode CheckPencilAndOrder(const Block<Matrix> &a, const Block<Matrix> &b, int32_t order) {
     if (const ErrorCode bad = CheckPencil(a, b))
         return bad;
-    if (order < schurUnordered || order > schurModulusDescending)
-        return ErrInvalidSelector;
+    return IsNoSchurOrder(order) ? ErrInvalidSelector : 0;
+}
+
+// Of n by n, q and z if they are wanted.
+template <class Matrix, class Vector>
+Outcome ResizeForm(int32_t n, bool withVectors, Out<Matrix> &q, Out<Matrix> &z, Out<CDB1D> &alpha,
+                   Out<Vector> &beta) {
     if (const Outcome bad = ResizeIf(withVectors, q, n))
         return bad;
     if (const Outcome bad = ResizeIf(withVectors, z, n))
         return bad;
     if (const Outcome bad = alpha.resize(n))
         return bad;
-    if (const Outcome bad = beta.resize(n))
+    return beta.resize(n);
+}
+
+template <class Matrix, class Vector>
+Outcome QZ(InOut<Matrix> a, InOut<Matrix> b, bool withVectors, int32_t order, Out<Matrix> q,
+           Out<Matrix> z, Out<CDB1D> alpha, Out<Vector> beta) {
+    if (const ErrorCode bad = CheckPencilAndOrder(a, b, order))
         return bad;
-    return GeneralisedSchur(a.data(), b.data(), n, order, withVectors ? q.data() : nullptr,
-                            withVectors ? z.data() : nullptr, alpha.data(), beta.data(), nullptr);
+    if (const Outcome bad = ResizeForm(a.rows(), withVectors, q, z, alpha, beta))
+        return bad;
+    return GeneralisedSchur<elementOf<Matrix>>(a.view(), b.view(), SchurOrder{order}, q.view(),
+                                               z.view(), alpha.view(), beta.view(), {});
 }
 
 template <class Matrix, class Vector>
 Outcome QZWithEigenvectors(InOut<Matrix> a, InOut<Matrix> b, int32_t order, Out<Matrix> q,
                            Out<Matrix> z, Out<CDB1D> alpha, Out<Vector> beta, Out<CDB2D> vectors) {
     const int32_t n = a.rows();
-    if (const ErrorCode bad = CheckPencil(a, b))
+    if (const ErrorCode bad = CheckPencilAndOrder(a, b, order))
         return bad;
-    if (order < schurUnordered || order > schurModulusDescending)
-        return ErrInvalidSelector;
-    if (const Outcome bad = q.resize(n, n))
-        return bad;
-    if (const Outcome bad = z.resize(n, n))
-        return bad;
-    if (const Outcome bad = alpha.resize(n))
-        return bad;
-    if (const Outcome bad = beta.resize(n))
+    if (const Outcome bad = ResizeForm(n, true, q, z, alpha, beta))
         return bad;
     if (const Outcome bad = vectors.resize(n, n))
         return bad;
-    return GeneralisedSchur(a.data(), b.data(), n, order, q.data(), z.data(), alpha.data(),
-                            beta.data(), vectors.data());
+    return GeneralisedSchur<elementOf<Matrix>>(a.view(), b.view(), SchurOrder{order}, q.view(),
+                                               z.view(), alpha.view(), beta.view(), vectors.view());
 }
 
-CDB Quotient(CDB alpha, CDB beta) {
+// alpha / beta: infinite for beta 0, and NaN where both are 0.
+CDB EigenvalueOf(CDB alpha, CDB beta) {
     if (AbsSum(beta) != 0.0)
         return alpha / beta;
     const double inf = std::numeric_limits<double>::infinity();
     const double nan = std::numeric_limits<double>::quiet_NaN();
     return AbsSum(alpha) != 0.0 ? CDB{inf, 0.0} : CDB{nan, nan};
 }
-CDB Quotient(CDB alpha, double beta) { return Quotient(alpha, CDB{beta, 0.0}); }
 
 template <class Matrix>
 Outcome GeneralisedEigen(In<Matrix> a, In<Matrix> b, int32_t output, Out<CDB1D> values,
                          Out<CDB2D> vectors) {
-    constexpr ElementType E = HandleTraits<Matrix>::code;
+    constexpr ElementType E = elementOf<Matrix>;
     const int32_t n = a.rows();
     if (const ErrorCode bad = CheckPencil(a, b))
         return bad;
@@ -89,21 +85,19 @@ Outcome GeneralisedEigen(In<Matrix> a, In<Matrix> b, int32_t output, Out<CDB1D> 
     const bool withVectors = output == eigenValuesAndVectors;
     if (const Outcome bad = ResizeIf(withVectors, vectors, n))
         return bad;
-    const int64_t count = int64_t{n} * n;
-    Scratch<E> copies;
-    if (const ErrorCode failed = copies.allocate(2 * count + n))
+    MatrixView<E> s, t;
+    VectorView<E> beta;
+    ScratchParts memory;
+    if (const ErrorCode failed = memory.take(Sized(s, n, n), Sized(t, n, n), Sized(beta, n)))
         return failed;
-    for (int64_t i = 0; i < count; ++i) {
-        copies[i] = a.data()[i];
-        copies[count + i] = b.data()[i];
-    }
-    typename Element<E>::type *const beta = copies.data() + 2 * count;
+    CopyMatrix<E>(a.view(), s);
+    CopyMatrix<E>(b.view(), t);
+    const ComplexVector alpha = values.view();
     if (const ErrorCode failed =
-            GeneralisedSchur(copies.data(), copies.data() + count, n, schurUnordered, nullptr,
-                             nullptr, values.data(), beta, withVectors ? vectors.data() : nullptr))
+            GeneralisedSchur<E>(s, t, schurUnordered, {}, {}, alpha, beta, vectors.view()))
         return failed;
     for (int32_t i = 0; i < n; ++i)
-        values.data()[i] = Quotient(values.data()[i], beta[i]);
+        alpha[i] = EigenvalueOf(alpha[i], {RealPart(beta[i]), ImagPart(beta[i])});
     return 0;
 }
 
@@ -124,8 +118,13 @@ Outcome GeneralisedSVD(InOut<Matrix> a, InOut<Matrix> b, Out<DBL1D> alpha, Out<D
         return bad;
     if (const Outcome bad = q.resize(n, n))
         return bad;
-    return GeneralisedSingular(a.data(), b.data(), m, n, p, k.address(), l.address(), alpha.data(),
-                               beta.data(), u.data(), v.data(), q.data());
+    GeneralisedRanks ranks;
+    if (const ErrorCode failed = GeneralisedSingular<elementOf<Matrix>>(
+            a.view(), b.view(), &ranks, alpha.view(), beta.view(), u.view(), v.view(), q.view()))
+        return failed;
+    k = ranks.k;
+    l = ranks.l;
+    return 0;
 }
 
 } // namespace

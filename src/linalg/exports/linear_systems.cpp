@@ -1,7 +1,6 @@
 #include "qx/linear_systems.h"
 
-#include "frame/export.h"
-#include "linalg/matrix.h"
+#include "linalg/exports/checks.h"
 #include "linalg/systems/banded.h"
 #include "linalg/systems/least_squares.h"
 #include "linalg/systems/lu.h"
@@ -26,7 +25,7 @@ Outcome SolveLU(In<Matrix> a, In<Vector> b, Out<Vector> x) {
         return bad;
     if (const Outcome bad = x.resize(a.rows()))
         return bad;
-    return SolveByLU(a.data(), a.rows(), b.data(), x.data());
+    return SolveByLU<elementOf<Matrix>>(a.view(), b.view(), x.view());
 }
 
 // kept: nothing is solved; the export always fails once its arguments are good.
@@ -49,15 +48,15 @@ Outcome SolveWithFactors(In<Matrix> lu, In<I32_1D> pivots, InOut<Vector> b) {
                         {pivots.size() != lu.rows(), ErrSizeMismatch},
                         {b.size() != lu.rows(), ErrSizeMismatch}}))
         return bad;
-    return LUSolve(lu.data(), pivots.data(), b.data(), lu.rows(), 1, b.data());
+    return LUSolve<elementOf<Matrix>>(lu.view(), pivots.view(), AsColumn(b.view()),
+                                      AsColumn(b.view()));
 }
 
 template <class Matrix>
 Outcome Invert(InOut<Matrix> a) {
-    if (const Outcome bad =
-            LastFailed({{a.isEmpty(), ErrEmptyInput}, {!a.isSquare(), ErrNotSquare}}))
+    if (const Outcome bad = SquareLast(a))
         return bad;
-    return InvertByLU(a.data(), a.rows(), a.data());
+    return InvertByLU<elementOf<Matrix>>(a.view(), a.view());
 }
 
 template <class Matrix>
@@ -66,7 +65,7 @@ Outcome InvertFromFactors(InOut<Matrix> lu, In<I32_1D> pivots) {
                                         {!lu.isSquare(), ErrNotSquare},
                                         {pivots.size() != lu.rows(), ErrSizeMismatch}}))
         return bad;
-    return InvertFactors(lu.data(), pivots.data(), lu.rows());
+    return InvertFactors<elementOf<Matrix>>(lu.view(), pivots.view());
 }
 
 // Least squares.
@@ -79,7 +78,7 @@ Outcome SolveLeastSquares(In<Matrix> a, In<Vector> b, Out<Vector> x, double tole
     if (const Outcome bad = x.resize(a.cols()))
         return bad;
     return WithoutRankWarning(
-        SolveBySVD(a.data(), a.rows(), a.cols(), b.data(), 1, x.data(), tolerance));
+        SolveBySVD<elementOf<Matrix>>(a.view(), AsColumn(b.view()), AsColumn(x.view()), tolerance));
 }
 
 template <class Matrix>
@@ -89,7 +88,7 @@ Outcome SolveLeastSquaresSet(In<Matrix> a, In<Matrix> b, Out<Matrix> x, double t
         return bad;
     if (const Outcome bad = x.resize(a.cols(), b.cols()))
         return bad;
-    return SolveBySVD(a.data(), a.rows(), a.cols(), b.data(), b.cols(), x.data(), tolerance);
+    return SolveBySVD<elementOf<Matrix>>(a.view(), b.view(), x.view(), tolerance);
 }
 
 // The memory that is shown, with `more` elements than the plain method needs.
@@ -109,8 +108,7 @@ Outcome SolveShowingWork(In<DBL2D> a, In<DBL1D> b, Out<DBL1D> x, double toleranc
         return bad;
     if (const Outcome bad = ResizeWork(a, work, 0))
         return bad;
-    return WithoutRankWarning(
-        SolveBySVDIn(work.data(), a.data(), a.rows(), a.cols(), b.data(), x.data(), tolerance));
+    return WithoutRankWarning(SolveBySVDIn(work.view(), a.view(), b.view(), x.view(), tolerance));
 }
 
 Outcome SolveRefined(In<DBL2D> a, In<DBL1D> b, Out<DBL1D> x, double tolerance, int32_t refinements,
@@ -124,8 +122,8 @@ Outcome SolveRefined(In<DBL2D> a, In<DBL1D> b, Out<DBL1D> x, double tolerance, i
         return bad;
     if (const Outcome bad = ResizeWork(a, work, int64_t{a.rows()} + a.cols()))
         return bad;
-    return WithoutRankWarning(SolveBySVDRefined(work.data(), a.data(), a.rows(), a.cols(), b.data(),
-                                                x.data(), tolerance, refinements));
+    return WithoutRankWarning(
+        SolveBySVDRefined(work.view(), a.view(), b.view(), x.view(), tolerance, refinements));
 }
 
 // Positive definite matrices.
@@ -138,18 +136,20 @@ Outcome SolveDefinite(In<Matrix> a, In<Vector> b, Out<Vector> x) {
         return bad;
     if (const Outcome bad = x.resize(a.rows()))
         return bad;
-    return CholeskySolve(a.data(), a.rows(), 1, b.data(), 1, x.data());
+    return CholeskySolve<elementOf<Matrix>>(a.view(), upperTriangle, AsColumn(b.view()),
+                                            AsColumn(x.view()));
 }
 
 template <class Matrix>
-Outcome SolveDefiniteSet(In<Matrix> a, int32_t useUpper, In<Matrix> b, Out<Matrix> x) {
+Outcome SolveDefiniteSet(In<Matrix> a, bool useUpper, In<Matrix> b, Out<Matrix> x) {
     if (const Outcome bad = FirstFailed({{a.isEmpty() || b.isEmpty(), ErrEmptyInput},
                                          {!a.isSquare(), ErrNotSquare},
                                          {b.rows() != a.rows(), ErrSizeMismatch}}))
         return bad;
     if (const Outcome bad = x.resize(a.rows(), b.cols()))
         return bad;
-    return CholeskySolve(a.data(), a.rows(), useUpper, b.data(), b.cols(), x.data());
+    return CholeskySolve<elementOf<Matrix>>(a.view(), useUpper ? upperTriangle : lowerTriangle,
+                                            b.view(), x.view());
 }
 
 template <class Vector>
@@ -159,61 +159,62 @@ Outcome SolveWithCholesky(In<Vector> packedFactor, InOut<Vector> b) {
                                         {n < 0, ErrNotSquare},
                                         {n >= 0 && b.size() != n, ErrSizeMismatch}}))
         return bad;
-    return Substitute(Factors::cholesky, packedFactor.data(), n, 1, b.data());
+    return Substitute<elementOf<Vector>>(Factors::cholesky, packedFactor.view(),
+                                         AsColumn(b.view()));
 }
 
 // Triangles.
 
 template <class Matrix>
 Outcome SolveTriangleSet(In<Matrix> a, int32_t triangle, In<Matrix> b, Out<Matrix> x) {
-    if (const Outcome bad = FirstFailed(
-            {{a.isEmpty() || b.isEmpty(), ErrEmptyInput},
-             {!a.isSquare(), ErrNotSquare},
-             {b.rows() != a.rows(), ErrSizeMismatch},
-             {triangle != lowerTriangle && triangle != upperTriangle, ErrInvalidSelector}}))
+    if (const Outcome bad = FirstFailed({{a.isEmpty() || b.isEmpty(), ErrEmptyInput},
+                                         {!a.isSquare(), ErrNotSquare},
+                                         {b.rows() != a.rows(), ErrSizeMismatch},
+                                         {IsNoTriangle(triangle), ErrInvalidSelector}}))
         return bad;
     if (const Outcome bad = x.resize(a.rows(), b.cols()))
         return bad;
-    Scratch<HandleTraits<Matrix>::code> packed;
-    if (const ErrorCode failed = packed.allocate(PackedLength(a.rows())))
+    constexpr ElementType E = elementOf<Matrix>;
+    VectorView<E> packed;
+    ScratchParts memory;
+    if (const ErrorCode failed = memory.take(Sized(packed, PackedLength(a.rows()))))
         return failed;
-    PackMatrix(a.data(), a.rows(), triangle, packed.data());
-    std::memcpy(x.data(), b.data(),
-                sizeof *b.data() * static_cast<std::size_t>(b.rows()) * b.cols());
-    return SolveTriangular(packed.data(), a.rows(), triangle, b.cols(), x.data());
+    PackMatrix<E>(a.view(), Triangle{triangle}, packed);
+    CopyMatrix<E>(b.view(), x.view());
+    return SolveTriangular<E>(packed, Triangle{triangle}, x.view());
 }
 
 template <class Vector>
 Outcome SolveTriangle(In<Vector> packed, int32_t triangle, InOut<Vector> b) {
     const int32_t n = OrderOfPacked(packed.size());
-    if (const Outcome bad = LastFailed(
-            {{packed.isEmpty() || b.isEmpty(), ErrEmptyInput},
-             {n < 0, ErrNotSquare},
-             {n >= 0 && b.size() != n, ErrSizeMismatch},
-             {triangle != lowerTriangle && triangle != upperTriangle, ErrInvalidSelector}}))
+    if (const Outcome bad = LastFailed({{packed.isEmpty() || b.isEmpty(), ErrEmptyInput},
+                                        {n < 0, ErrNotSquare},
+                                        {n >= 0 && b.size() != n, ErrSizeMismatch},
+                                        {IsNoTriangle(triangle), ErrInvalidSelector}}))
         return bad;
-    return SolveTriangular(packed.data(), n, triangle, 1, b.data());
+    return SolveTriangular<elementOf<Vector>>(packed.view(), Triangle{triangle},
+                                              AsColumn(b.view()));
 }
 
 // Bands.
 
-// Sizes of one vector or of several right sides, as rows and columns.
-int32_t Rows(const InOut<DBL1D> &b) { return b.size(); }
-int32_t Rows(const InOut<CDB1D> &b) { return b.size(); }
-int32_t Rows(const InOut<DBL2D> &b) { return b.rows(); }
-int32_t Rows(const InOut<CDB2D> &b) { return b.rows(); }
-int32_t Cols(const InOut<DBL1D> &) { return 1; }
-int32_t Cols(const InOut<CDB1D> &) { return 1; }
-int32_t Cols(const InOut<DBL2D> &b) { return b.cols(); }
-int32_t Cols(const InOut<CDB2D> &b) { return b.cols(); }
+// One right side or several, as a matrix.
+RealMatrix RightSides(const InOut<DBL1D> &b) { return AsColumn(b.view()); }
+ComplexMatrix RightSides(const InOut<CDB1D> &b) { return AsColumn(b.view()); }
+RealMatrix RightSides(const InOut<DBL2D> &b) { return b.view(); }
+ComplexMatrix RightSides(const InOut<CDB2D> &b) { return b.view(); }
 
 template <class Matrix, class RightSide>
 Outcome SolveBands(In<Matrix> band, InOut<RightSide> b, int32_t lowerBands, int32_t upperBands) {
-    if (const Outcome bad =
-            FirstFailed({{band.rows() != int64_t{lowerBands} + upperBands + 1, ErrSizesDisagree},
-                         {Rows(b) != band.cols(), ErrBandVectorSize}}))
+    const auto rightSides = RightSides(b);
+    const int64_t bands = int64_t{lowerBands} + upperBands + 1;
+    if (const Outcome bad = FirstFailed(
+            {{band.rows() != bands, ErrSizesDisagree},
+             {rightSides.rows() != band.cols(), ErrBandVectorSize},
+             {rightSides.isEmpty(), ErrEmptyInput},
+             {lowerBands < 0 || upperBands < 0 || bands > band.cols(), ErrSizesDisagree}}))
         return bad;
-    return SolveBand(band.data(), band.cols(), lowerBands, upperBands, Cols(b), b.data());
+    return SolveBand<elementOf<Matrix>>(band.view(), lowerBands, upperBands, rightSides);
 }
 
 Outcome FactorTridiagonals(InOut<DBL1D> lower, InOut<DBL1D> diag, InOut<DBL1D> upper,
@@ -227,22 +228,23 @@ Outcome FactorTridiagonals(InOut<DBL1D> lower, InOut<DBL1D> diag, InOut<DBL1D> u
         return bad;
     if (const Outcome bad = pivots.resize(n))
         return bad;
-    return FactorTridiagonal(n, lower.data(), diag.data(), upper.data(), upper2.data(),
-                             pivots.data());
+    return FactorTridiagonal({lower.view(), diag.view(), upper.view(), upper2.view()},
+                             pivots.view());
 }
 
 template <class RightSide>
-Outcome SolveTridiagonals(int32_t transposed, In<DBL1D> lower, In<DBL1D> diag, In<DBL1D> upper,
+Outcome SolveTridiagonals(bool transposed, In<DBL1D> lower, In<DBL1D> diag, In<DBL1D> upper,
                           In<DBL1D> upper2, In<I32_1D> pivots, InOut<RightSide> b) {
     const int32_t n = diag.size();
+    const RealMatrix rightSides = RightSides(b);
     if (const Outcome bad =
             FirstFailed({{n < 3, ErrFewerThanThree},
                          {lower.size() != n - 1 || upper.size() != n - 1, ErrSizesDisagree},
                          {upper2.size() != n - 2 || pivots.size() != n, ErrSizesDisagree},
-                         {Rows(b) != n || Cols(b) < 1, ErrSizesDisagree}}))
+                         {rightSides.rows() != n || rightSides.cols() < 1, ErrSizesDisagree}}))
         return bad;
-    return SolveTridiagonal(transposed != 0, n, lower.data(), diag.data(), upper.data(),
-                            upper2.data(), pivots.data(), Cols(b), b.data());
+    return SolveTridiagonal(transposed, {lower.view(), diag.view(), upper.view(), upper2.view()},
+                            pivots.view(), rightSides);
 }
 
 } // namespace
@@ -318,10 +320,10 @@ int32_t CxEqsByCholeskyDri_head(CDB2D a, CDB1D b, CDB1D x, ErrorCode *err) {
     return InErr(err, qx::SolveDefinite<CDB2D, CDB1D>, a, b, x);
 }
 ErrorCode EqsSetByCholeskyDri_head(DBL2D a, int32_t useUpper, DBL2D b, DBL2D x) {
-    return Returned(qx::SolveDefiniteSet<DBL2D>, a, useUpper, b, x);
+    return Returned(qx::SolveDefiniteSet<DBL2D>, a, useUpper != 0, b, x);
 }
 ErrorCode CxEqsSetByCholeskyDri_head(CDB2D a, int32_t useUpper, CDB2D b, CDB2D x) {
-    return Returned(qx::SolveDefiniteSet<CDB2D>, a, useUpper, b, x);
+    return Returned(qx::SolveDefiniteSet<CDB2D>, a, useUpper != 0, b, x);
 }
 int32_t CholeskyLinEqs_head(DBL1D packedFactor, DBL1D b, ErrorCode *err) {
     return InErr(err, qx::SolveWithCholesky<DBL1D>, packedFactor, b);
@@ -361,11 +363,11 @@ ErrorCode TriDiagLU_head(DBL1D lower, DBL1D diag, DBL1D upper, DBL1D upper2, I32
 }
 ErrorCode TriDiagEqsByLU_head(int32_t transposed, DBL1D lower, DBL1D diag, DBL1D upper,
                               DBL1D upper2, I32_1D pivots, DBL1D b) {
-    return Returned(qx::SolveTridiagonals<DBL1D>, transposed, lower, diag, upper, upper2, pivots,
-                    b);
+    return Returned(qx::SolveTridiagonals<DBL1D>, transposed != 0, lower, diag, upper, upper2,
+                    pivots, b);
 }
 ErrorCode TriDiagEqsSetByLU_head(int32_t transposed, DBL1D lower, DBL1D diag, DBL1D upper,
                                  DBL1D upper2, I32_1D pivots, DBL2D b) {
-    return Returned(qx::SolveTridiagonals<DBL2D>, transposed, lower, diag, upper, upper2, pivots,
-                    b);
+    return Returned(qx::SolveTridiagonals<DBL2D>, transposed != 0, lower, diag, upper, upper2,
+                    pivots, b);
 }

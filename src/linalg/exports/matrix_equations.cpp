@@ -1,7 +1,7 @@
 #include "qx/matrix_equations.h"
 
-#include "frame/export.h"
 #include "linalg/equations/matrix_equations.h"
+#include "linalg/exports/checks.h"
 
 namespace qx {
 namespace {
@@ -16,7 +16,8 @@ Outcome SolvedSylvester(In<Matrix> a, In<Matrix> b, In<Matrix> c, int32_t equati
         return bad;
     if (const Outcome bad = x.resize(a.rows(), b.rows()))
         return bad;
-    return SolveSylvester(a.data(), a.rows(), b.data(), b.rows(), c.data(), equation, x.data());
+    return SolveSylvester<elementOf<Matrix>>(a.view(), b.view(), c.view(),
+                                             SylvesterEquation{equation}, x.view());
 }
 
 template <class Matrix>
@@ -29,7 +30,8 @@ Outcome SolvedLyapunov(In<Matrix> a, In<Matrix> q, int32_t equation, Out<Matrix>
         return bad;
     if (const Outcome bad = x.resize(a.rows(), a.rows()))
         return bad;
-    return SolveLyapunov(a.data(), a.rows(), q.data(), equation, x.data());
+    return SolveLyapunov<elementOf<Matrix>>(a.view(), q.view(), LyapunovEquation{equation},
+                                            x.view());
 }
 
 } // namespace

@@ -1,12 +1,11 @@
 #include "qx/matrix_factorisations.h"
 
-#include "frame/export.h"
+#include "linalg/exports/checks.h"
 #include "linalg/factorisations/balance.h"
 #include "linalg/factorisations/cholesky.h"
 #include "linalg/factorisations/hessenberg.h"
 #include "linalg/factorisations/qr.h"
 #include "linalg/factorisations/svd.h"
-#include "linalg/matrix.h"
 #include "linalg/systems/lu.h"
 
 #include <algorithm>
@@ -14,15 +13,8 @@
 namespace qx {
 namespace {
 
-template <class Handle>
-constexpr ElementType elementOf = HandleTraits<Handle>::code;
-
 // kept: of all exports here that have an `err`, the last failed check decides
 
-template <class Matrix>
-ErrorCode CheckSquare(const Block<Matrix> &a) {
-    return LastFailed({{a.isEmpty(), ErrEmptyInput}, {!a.isSquare(), ErrNotSquare}});
-}
 template <class Vector>
 ErrorCode CheckPacked(const Block<Vector> &packed) {
     return LastFailed({{packed.isEmpty(), ErrEmptyInput},
@@ -35,35 +27,28 @@ Outcome LU(InOut<Matrix> a, Out<I32_1D> pivots, OutI32 parity) {
         return ErrEmptyInput;
     if (const Outcome bad = pivots.resize(a.rows()))
         return bad;
-    return LUDecompose(a.data(), a.rows(), a.cols(), pivots.data(), parity.address());
+    return LUDecompose<elementOf<Matrix>>(a.view(), pivots.view(), parity.address());
 }
 
 template <class Vector>
 Outcome Cholesky(InOut<Vector> packed) {
     if (const ErrorCode bad = CheckPacked(packed))
         return bad;
-    return PackedCholesky(packed.data(), OrderOfPacked(packed.size()));
-}
-
-// The square matrix of a packed Hermitian one.
-template <ElementType E>
-void ExpandHermitian(const ElementOf<E> *packed, int32_t n, ElementOf<E> *a) {
-    ExpandPacked(packed, n, lowerTriangle, a);
-    for (int32_t i = 0; i < n; ++i)
-        for (int32_t j = i + 1; j < n; ++j)
-            a[i * n + j] = Conj(a[j * n + i]);
+    return PackedCholesky<elementOf<Vector>>(packed.view(), OrderOfPacked(packed.size()));
 }
 
 template <class Matrix>
 Outcome FullCholesky(InOut<Matrix> a) {
-    if (const ErrorCode bad = CheckSquare(a))
+    if (const ErrorCode bad = SquareLast(a))
         return bad;
-    Scratch<elementOf<Matrix>> packed;
-    if (const ErrorCode bad = packed.allocate(PackedLength(a.rows())))
-        return bad;
-    PackMatrix(a.data(), a.rows(), lowerTriangle, packed.data());
-    const ErrorCode status = PackedCholesky(packed.data(), a.rows());
-    ExpandPacked(packed.data(), a.rows(), lowerTriangle, a.data());
+    constexpr ElementType E = elementOf<Matrix>;
+    VectorView<E> packed;
+    ScratchParts memory;
+    if (const ErrorCode failed = memory.take(Sized(packed, PackedLength(a.rows()))))
+        return failed;
+    PackMatrix<E>(a.view(), lowerTriangle, packed);
+    const ErrorCode status = PackedCholesky<E>(packed, a.rows());
+    ExpandPacked<E>(packed, lowerTriangle, a.view());
     return status;
 }
 
@@ -71,28 +56,29 @@ template <class Vector>
 Outcome InverseFromFactor(InOut<Vector> packed) {
     if (const ErrorCode bad = CheckPacked(packed))
         return bad;
-    return InvertFromCholesky(packed.data(), OrderOfPacked(packed.size()));
+    return InvertFromCholesky<elementOf<Vector>>(packed.view(), OrderOfPacked(packed.size()));
 }
 
 template <ElementType E>
-ErrorCode InvertPositiveDefinite(ElementOf<E> *a, int32_t n, ElementOf<E> *packed) {
-    PackMatrix(a, n, symmetric, packed);
-    if (const ErrorCode failed = PackedCholesky(packed, n))
+ErrorCode InvertPositiveDefinite(MatrixView<E> a, VectorView<E> packed) {
+    PackMatrix<E>(a, symmetric, packed);
+    if (const ErrorCode failed = PackedCholesky<E>(packed, a.rows()))
         return failed;
-    if (const ErrorCode failed = InvertFromCholesky(packed, n))
+    if (const ErrorCode failed = InvertFromCholesky<E>(packed, a.rows()))
         return failed;
-    ExpandHermitian<E>(packed, n, a);
+    ExpandPacked<E>(packed, hermitian, a);
     return 0;
 }
 
 template <class Matrix>
 Outcome InversePositiveDefinite(InOut<Matrix> a) {
-    if (const ErrorCode bad = CheckSquare(a))
+    if (const ErrorCode bad = SquareLast(a))
         return bad;
-    Scratch<elementOf<Matrix>> packed;
-    if (const ErrorCode bad = packed.allocate(PackedLength(a.rows())))
-        return bad;
-    return InvertPositiveDefinite<elementOf<Matrix>>(a.data(), a.rows(), packed.data());
+    VectorView<elementOf<Matrix>> packed;
+    ScratchParts memory;
+    if (const ErrorCode failed = memory.take(Sized(packed, PackedLength(a.rows()))))
+        return failed;
+    return InvertPositiveDefinite<elementOf<Matrix>>(a.view(), packed);
 }
 
 Outcome InversePreallocated(InOut<DBL2D> a, InOut<DBL1D, OnFailure::Keep> work) {
@@ -100,11 +86,7 @@ Outcome InversePreallocated(InOut<DBL2D> a, InOut<DBL1D, OnFailure::Keep> work) 
                                           {!a.isSquare(), ErrNotSquare},
                                           {work.size() < PackedLength(a.rows()), ErrSizeMismatch}}))
         return bad;
-    return InvertPositiveDefinite<ElementType::DBL>(a.data(), a.rows(), work.data());
-}
-
-bool IsNoTriangle(int32_t triangle) {
-    return triangle != lowerTriangle && triangle != upperTriangle;
+    return InvertPositiveDefinite<ElementType::DBL>(a.view(), work.view());
 }
 
 template <class Vector>
@@ -114,7 +96,8 @@ Outcome InversePackedTriangle(InOut<Vector> packed, int32_t triangle) {
                         {!packed.isEmpty() && OrderOfPacked(packed.size()) < 0, ErrNotSquare},
                         {IsNoTriangle(triangle), ErrInvalidSelector}}))
         return bad;
-    return InvertTriangle(packed.data(), OrderOfPacked(packed.size()), triangle);
+    return InvertTriangle<elementOf<Vector>>(packed.view(), OrderOfPacked(packed.size()),
+                                             Triangle{triangle});
 }
 
 template <class Matrix>
@@ -123,13 +106,15 @@ Outcome InverseTriangle(InOut<Matrix> a, int32_t triangle) {
                                           {!a.isSquare(), ErrNotSquare},
                                           {IsNoTriangle(triangle), ErrInvalidSelector}}))
         return bad;
-    Scratch<elementOf<Matrix>> packed;
-    if (const ErrorCode bad = packed.allocate(PackedLength(a.rows())))
-        return bad;
-    PackMatrix(a.data(), a.rows(), triangle, packed.data());
-    if (const ErrorCode failed = InvertTriangle(packed.data(), a.rows(), triangle))
+    constexpr ElementType E = elementOf<Matrix>;
+    VectorView<E> packed;
+    ScratchParts memory;
+    if (const ErrorCode failed = memory.take(Sized(packed, PackedLength(a.rows()))))
         return failed;
-    ExpandPacked(packed.data(), a.rows(), triangle, a.data());
+    PackMatrix<E>(a.view(), Triangle{triangle}, packed);
+    if (const ErrorCode failed = InvertTriangle<E>(packed, a.rows(), Triangle{triangle}))
+        return failed;
+    ExpandPacked<E>(packed, Triangle{triangle}, a.view());
     return 0;
 }
 
@@ -143,18 +128,18 @@ Outcome QRByAlgorithm(In<Matrix> a, int32_t algorithm, Out<Matrix> q, Out<Matrix
         return bad;
     if (const Outcome bad = r.resize(m, n))
         return bad;
+    constexpr ElementType E = elementOf<Matrix>;
     if (algorithm == 0)
-        return QRDecompose(a.data(), m, n, qrFull, q.data(), r.data());
-    return QRByGramSchmidt(a.data(), m, n,
-                           algorithm == 1 ? GramSchmidt::Modified : GramSchmidt::Classical,
-                           q.data(), r.data());
+        return QRDecompose<E>(a.view(), qrFull, q.view(), r.view());
+    const GramSchmidt order = algorithm == 1 ? GramSchmidt::Modified : GramSchmidt::Classical;
+    return QRByGramSchmidt<E>(a.view(), order, q.view(), r.view());
 }
 
 // permutation[pivots[j]][j] = 1
-void WritePermutation(const I32 *pivots, int32_t n, I32 *permutation) {
-    for (int32_t i = 0; i < n; ++i)
-        for (int32_t j = 0; j < n; ++j)
-            permutation[i * n + j] = pivots[j] == i;
+void WritePermutation(ConstIndexVector pivots, MatrixView<ElementType::I32> permutation) {
+    for (int32_t i = 0; i < permutation.rows(); ++i)
+        for (int32_t j = 0; j < permutation.cols(); ++j)
+            permutation(i, j) = pivots[j] == i;
 }
 
 template <class Matrix>
@@ -171,15 +156,17 @@ Outcome QR(In<Matrix> a, bool pivoting, int32_t form, Out<I32_2D> permutation, O
         return bad;
     if (const Outcome bad = r.resize(size, n))
         return bad;
+    constexpr ElementType E = elementOf<Matrix>;
     if (!pivoting)
-        return QRDecompose(a.data(), m, n, form, q.data(), r.data());
-    Scratch<ElementType::I32> pivots;
-    if (const ErrorCode failed = pivots.allocate(n))
+        return QRDecompose<E>(a.view(), QRForm{form}, q.view(), r.view());
+    IndexVector pivots;
+    ScratchParts memory;
+    if (const ErrorCode failed = memory.take(Sized(pivots, n)))
         return failed;
     if (const ErrorCode failed =
-            QRDecomposePivoted(a.data(), m, n, form, pivots.data(), q.data(), r.data()))
+            QRDecomposePivoted<E>(a.view(), QRForm{form}, pivots, q.view(), r.view()))
         return failed;
-    WritePermutation(pivots.data(), n, permutation.data());
+    WritePermutation(pivots, permutation.view());
     return 0;
 }
 
@@ -192,19 +179,21 @@ Outcome SVDInPlace(InOut<Matrix> a, Out<DBL1D> s, Out<Matrix> v) {
     if (a.isEmpty())
         return ErrEmptyInput;
     const int32_t m = a.rows(), n = a.cols(), k = std::min(m, n);
-    const int64_t count = int64_t{m} * n;
-    Scratch<elementOf<Matrix>> copy;
-    if (const ErrorCode failed = copy.allocate(count))
+    constexpr ElementType E = elementOf<Matrix>;
+    MatrixView<E> copy;
+    ScratchParts memory;
+    if (const ErrorCode failed = memory.take(Sized(copy, m, n)))
         return failed;
-    for (int64_t i = 0; i < count; ++i)
-        copy[i] = a.data()[i];
+    CopyMatrix<E>(a.view(), copy);
     if (const Outcome bad = a.resize(m, k))
         return bad;
     if (const Outcome bad = s.resize(k))
         return bad;
     if (const Outcome bad = v.resize(n, k))
         return bad;
-    return SVDecompose(copy.data(), m, n, a.data(), s.data(), v.data(), 0);
+    if (!AllFinite<E>(copy))
+        return ErrNonFiniteInput;
+    return SVDecompose<E>(copy, a.view(), s.view(), v.view());
 }
 
 template <class Matrix>
@@ -218,7 +207,10 @@ Outcome SVD(In<Matrix> a, bool full, Out<Matrix> u, Out<DBL1D> s, Out<Matrix> v)
         return bad;
     if (const Outcome bad = v.resize(n, full ? n : k))
         return bad;
-    return SVDecompose(a.data(), m, n, u.data(), s.data(), v.data(), full);
+    constexpr ElementType E = elementOf<Matrix>;
+    if (!AllFinite<E>(a.view()))
+        return ErrNonFiniteInput;
+    return SVDecompose<E>(a.view(), u.view(), s.view(), v.view());
 }
 
 template <class Matrix>
@@ -227,7 +219,10 @@ Outcome SVDValues(In<Matrix> a, Out<DBL1D> s) {
         return ErrEmptyInput;
     if (const Outcome bad = s.resize(std::min(a.rows(), a.cols())))
         return bad;
-    return SingularValues(a.data(), a.rows(), a.cols(), s.data());
+    constexpr ElementType E = elementOf<Matrix>;
+    if (!AllFinite<E>(a.view()))
+        return ErrNonFiniteInput;
+    return SingularValues<E>(a.view(), s.view());
 }
 
 bool IsNoRange(int32_t low, int32_t high, int32_t n) { return low < 1 || high < low || high > n; }
@@ -241,14 +236,15 @@ Outcome Hessenberg(InOut<Matrix> a, int32_t low, int32_t high, Out<Matrix> q) {
         return bad;
     if (const Outcome bad = q.resize(n, n))
         return bad;
-    if (CheckFinite(a.data(), int64_t{n} * n) != 0)
+    constexpr ElementType E = elementOf<Matrix>;
+    const MatrixView<E> h = a.view();
+    if (!AllFinite<E>(h))
         return ErrNonFiniteInput;
-    if (const ErrorCode failed =
-            ReduceToHessenberg<elementOf<Matrix>>(a.data(), n, n, low - 1, high - 1, q.data(), n))
+    if (const ErrorCode failed = ReduceToHessenberg<E>(h, low - 1, high - 1, q.view()))
         return failed;
     for (int32_t i = 2; i < n; ++i)
         for (int32_t j = 0; j < i - 1; ++j)
-            a.data()[i * n + j] = {};
+            h(i, j) = {};
     return 0;
 }
 
@@ -267,23 +263,24 @@ Outcome BalanceMatrix(InOut<Matrix> a, int32_t job, OutI32 low, OutI32 high, Out
         return bad;
     if (const Outcome bad = scale.resize(n))
         return bad;
-    if (CheckFinite(a.data(), int64_t{n} * n) != 0)
+    constexpr ElementType E = elementOf<Matrix>;
+    if (!AllFinite<E>(a.view()))
         return ErrNonFiniteInput;
-    const Balanced range =
-        Balance<elementOf<Matrix>>(a.data(), n, n, Permutes(job), Scales(job), scale.data());
+    const RealVector factors = scale.view();
+    const Balanced range = Balance<E>(a.view(), Permutes(job), Scales(job), factors);
     const bool single = Permutes(job) && range.low == range.high;
     for (int32_t i = 0; i < n; ++i)
         if (single || i < range.low || i > range.high)
-            scale.data()[i] += 1.0;
+            factors[i] += 1.0;
     low = range.low + 1;
     high = range.high + 1;
     return 0;
 }
 
-// Whether an exchange of rows, counted from 1, leads to no row.
-bool LeavesRows(const DBL *scale, int32_t from, int32_t to, int32_t n) {
-    for (int32_t i = from; i < to; ++i)
-        if (!(scale[i] >= 1.0 && scale[i] < n + 1.0))
+// Whether an exchange of rows, counted from 1, leads to no row of a matrix of order n.
+bool LeavesRows(ConstRealVector exchanges, int32_t n) {
+    for (const DBL &exchange : exchanges)
+        if (!(exchange >= 1.0 && exchange < n + 1.0))
             return true;
     return false;
 }
@@ -300,20 +297,21 @@ Outcome VectorsBack(int32_t job, int32_t side, int32_t low, int32_t high, In<DBL
         return bad;
     constexpr ElementType E = elementOf<Matrix>;
     const Balanced range = {low - 1, high - 1};
+    const ConstRealVector given = scale.view();
     if (Permutes(job) &&
-        (LeavesRows(scale.data(), 0, range.low, n) || LeavesRows(scale.data(), high, n, n)))
+        (LeavesRows(given.part(0, range.low), n) || LeavesRows(given.part(high, n - high), n)))
         return ErrIndexOutOfRange;
-    Scratch<ElementType::DBL> fromZero;
-    if (const ErrorCode failed = fromZero.allocate(n))
+    RealVector fromZero;
+    ScratchParts memory;
+    if (const ErrorCode failed = memory.take(Sized(fromZero, n)))
         return failed;
     for (int32_t i = 0; i < n; ++i)
-        fromZero[i] = i < range.low || i > range.high ? scale.data()[i] - 1.0 : scale.data()[i];
+        fromZero[i] = i < range.low || i > range.high ? given[i] - 1.0 : given[i];
     if (Scales(job))
-        UndoScaling<E>(fromZero.data(), range,
-                       side == 0 ? EigenvectorSide::Right : EigenvectorSide::Left, v.data(),
-                       v.cols(), v.cols());
+        UndoScaling<E>(fromZero, range, side == 0 ? EigenvectorSide::Right : EigenvectorSide::Left,
+                       v.view());
     if (Permutes(job))
-        UndoPermutation<E>(fromZero.data(), range, n, v.data(), v.cols(), v.cols());
+        UndoPermutation<E>(fromZero, range, v.view());
     return 0;
 }
 

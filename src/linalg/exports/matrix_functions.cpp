@@ -1,61 +1,63 @@
 #include "qx/matrix_functions.h"
 
-#include "frame/export.h"
+#include "linalg/exports/checks.h"
 #include "linalg/functions/functions.h"
 #include "linalg/systems/least_squares.h"
 
 namespace qx {
 namespace {
 
-template <class Handle>
-constexpr ElementType elementOf = HandleTraits<Handle>::code;
-
-// kept: of the exports with an `err`, the last failed check decides
-template <class Matrix>
-ErrorCode CheckSquare(const Block<Matrix> &a) {
-    return LastFailed({{a.isEmpty(), ErrEmptyInput}, {!a.isSquare(), ErrNotSquare}});
-}
-// kept: of the others a shape that is not square comes before an empty one
+// kept: of the exports without an `err` a shape that is not square comes before an empty one
 template <class Matrix>
 ErrorCode CheckShapeFirst(const Block<Matrix> &a) {
     return FirstFailed({{!a.isSquare(), ErrNotSquare}, {a.isEmpty(), ErrEmptyInput}});
 }
 
+void CopyAsComplex(ConstRealMatrix from, ComplexMatrix to) {
+    for (int32_t i = 0; i < from.rows(); ++i)
+        for (int32_t j = 0; j < from.cols(); ++j)
+            to(i, j) = {from(i, j), 0.0};
+}
+
 template <class Matrix>
 Outcome Exponential(InOut<Matrix> a) {
-    const ErrorCode bad = CheckSquare(a);
-    return bad != 0 ? bad : MatrixExponential(a.data(), a.rows());
+    if (const ErrorCode bad = SquareLast(a))
+        return bad;
+    return MatrixExponential<elementOf<Matrix>>(a.view());
 }
 Outcome LogarithmInPlace(InOut<CDB2D> a) {
-    const ErrorCode bad = CheckSquare(a);
-    return bad != 0 ? bad : MatrixLogarithm(a.data(), a.rows());
+    if (const ErrorCode bad = SquareLast(a))
+        return bad;
+    return MatrixLogarithm(a.view());
 }
 Outcome SquareRootInPlace(InOut<CDB2D> a) {
-    const ErrorCode bad = CheckSquare(a);
-    return bad != 0 ? bad : MatrixSquareRoot(a.data(), a.rows());
+    if (const ErrorCode bad = SquareLast(a))
+        return bad;
+    return MatrixSquareRoot(a.view(), a.view());
 }
 
 Outcome Logarithm(In<DBL2D> a, Out<CDB2D> out) {
-    if (const ErrorCode bad = CheckSquare(a))
+    if (const ErrorCode bad = SquareLast(a))
         return bad;
-    const int32_t n = a.rows();
-    if (const Outcome bad = out.resize(n, n))
+    if (const Outcome bad = out.resize(a.rows(), a.rows()))
         return bad;
-    for (int64_t i = 0; i < int64_t{n} * n; ++i)
-        out.data()[i] = {a.data()[i], 0.0};
-    return MatrixLogarithm(out.data(), n);
+    CopyAsComplex(a.view(), out.view());
+    return MatrixLogarithm(out.view());
 }
 
 Outcome SquareRootRealParts(InOut<DBL2D> a) {
-    if (const ErrorCode bad = CheckSquare(a))
+    if (const ErrorCode bad = SquareLast(a))
         return bad;
-    const int64_t count = int64_t{a.rows()} * a.rows();
-    Scratch<ElementType::CDB> root;
-    if (const ErrorCode failed = root.allocate(count))
+    ComplexMatrix root;
+    ScratchParts memory;
+    if (const ErrorCode failed = memory.take(Sized(root, a.rows(), a.rows())))
         return failed;
-    const ErrorCode status = MatrixSquareRoot(a.data(), a.rows(), root.data());
-    for (int64_t i = 0; status >= 0 && i < count; ++i)
-        a.data()[i] = root[i].re; // kept: the imaginary parts go without a sign
+    const RealMatrix result = a.view();
+    CopyAsComplex(result, root);
+    const ErrorCode status = MatrixSquareRoot(root, root);
+    for (int32_t i = 0; status >= 0 && i < result.rows(); ++i)
+        for (int32_t j = 0; j < result.cols(); ++j)
+            result(i, j) = root(i, j).re; // kept: the imaginary parts go without a sign
     return status;
 }
 
@@ -64,30 +66,24 @@ Outcome SquareRootOfReal(In<DBL2D> a, Out<CDB2D> out) {
         return bad;
     if (const Outcome bad = out.resize(a.rows(), a.rows()))
         return bad;
-    return MatrixSquareRoot(a.data(), a.rows(), out.data());
+    CopyAsComplex(a.view(), out.view());
+    return MatrixSquareRoot(out.view(), out.view());
 }
 
 template <class Matrix>
 Outcome Power(InOut<Matrix> a, int32_t power) {
     if (const ErrorCode bad = CheckShapeFirst(a))
         return bad;
-    const int64_t count = int64_t{a.rows()} * a.rows();
-    Scratch<elementOf<Matrix>> result;
-    if (const ErrorCode failed = result.allocate(count))
-        return failed;
-    if (const ErrorCode failed = MatrixPowerInteger(a.data(), a.rows(), power, result.data()))
-        return failed;
-    for (int64_t i = 0; i < count; ++i)
-        a.data()[i] = result[i];
-    return 0;
+    return MatrixPower<elementOf<Matrix>>(a.view(), power, a.view());
 }
 
 template <class Matrix>
 Outcome PseudoInverse(InOut<Matrix> a, double tolerance) {
     if (a.isEmpty())
         return ErrEmptyInput;
-    if (const ErrorCode failed =
-            PseudoInverseMatrix(a.data(), a.rows(), a.cols(), tolerance, a.data()))
+    constexpr ElementType E = elementOf<Matrix>;
+    const MatrixView<E> inverse(a.data(), a.cols(), a.rows());
+    if (const ErrorCode failed = PseudoInverseMatrix<E>(a.view(), tolerance, inverse))
         return failed;
     a.exchangeSizes();
     return 0;

@@ -1,20 +1,21 @@
-#include "linalg/products/products.h"
-
-#include "frame/export.h"
 #include "qx/matrix_products.h"
+
+#include "linalg/exports/checks.h"
+#include "linalg/products/products.h"
 
 namespace qx {
 namespace {
 
 template <class Matrix>
-Outcome Product(In<Matrix> a, In<Matrix> b, Out<Matrix> c, int32_t alignedCopy) {
+Outcome Product(In<Matrix> a, In<Matrix> b, Out<Matrix> c, bool copied) {
     if (a.cols() != b.rows())
         return ErrInnerDimensionMismatch;
     if (a.hasNegativeSize() || b.hasNegativeSize())
         return ErrNegativeDimension;
     if (const Outcome bad = c.resize(a.rows(), b.cols()))
         return bad;
-    return MatrixProduct(a.data(), b.data(), a.rows(), a.cols(), b.cols(), c.data(), alignedCopy);
+    return (copied ? MatrixProductOfCopies<elementOf<Matrix>>
+                   : MatrixProduct<elementOf<Matrix>>)(a.view(), b.view(), c.view());
 }
 
 // The copy that a caller asks for would change nothing here.
@@ -28,18 +29,20 @@ Outcome MatrixTimesVector(In<Matrix> a, In<Vector> x, Out<Vector> y) {
         return ErrInnerDimensionMismatch;
     if (const Outcome bad = y.resize(a.rows()))
         return bad;
-    return MatrixVectorProduct(a.data(), a.rows(), a.cols(), x.data(), y.data());
+    MatrixVectorProduct<elementOf<Matrix>>(a.view(), x.view(), y.view());
+    return 0;
 }
 
 template <class Matrix, class Vector>
-Outcome VectorTimesMatrix(In<Vector> x, In<Matrix> a, Out<Vector> y, int32_t alignedCopy) {
+Outcome VectorTimesMatrix(In<Vector> x, In<Matrix> a, Out<Vector> y, bool copied) {
     if (x.size() != a.rows())
         return ErrInnerDimensionMismatch;
     if (x.hasNegativeSize() || a.hasNegativeSize())
         return ErrNegativeDimension;
     if (const Outcome bad = y.resize(a.cols()))
         return bad;
-    return MatrixProduct(x.data(), a.data(), 1, x.size(), a.cols(), y.data(), alignedCopy);
+    return (copied ? MatrixProductOfCopies<elementOf<Matrix>>
+                   : MatrixProduct<elementOf<Matrix>>)(AsRow(x.view()), a.view(), AsRow(y.view()));
 }
 
 } // namespace
@@ -48,13 +51,13 @@ Outcome VectorTimesMatrix(In<Vector> x, In<Matrix> a, Out<Vector> y, int32_t ali
 using qx::InErrWithHost;
 
 int32_t MatrixMulAligned_head(DBL2D a, DBL2D b, DBL2D c, int32_t alignedCopy, ErrorCode *err) {
-    return InErrWithHost(err, qx::Product<DBL2D>, a, b, c, alignedCopy);
+    return InErrWithHost(err, qx::Product<DBL2D>, a, b, c, alignedCopy != 0);
 }
 int32_t MatrixMul_head(DBL2D a, DBL2D b, DBL2D c, ErrorCode *err) {
     return MatrixMulAligned_head(a, b, c, 0, err);
 }
 int32_t AxBCxAlignedCIN(CDB2D a, CDB2D b, CDB2D c, int32_t alignedCopy, ErrorCode *err) {
-    return InErrWithHost(err, qx::Product<CDB2D>, a, b, c, alignedCopy);
+    return InErrWithHost(err, qx::Product<CDB2D>, a, b, c, alignedCopy != 0);
 }
 int32_t AxBCxCIN(CDB2D a, CDB2D b, CDB2D c, ErrorCode *err) {
     return AxBCxAlignedCIN(a, b, c, 0, err);
@@ -74,13 +77,13 @@ int32_t AxVectorCx(CDB2D a, CDB1D x, CDB1D y, ErrorCode *err) {
 }
 
 int32_t vectxAAligned_head(DBL1D x, DBL2D a, DBL1D y, int32_t alignedCopy, ErrorCode *err) {
-    return InErrWithHost(err, qx::VectorTimesMatrix<DBL2D, DBL1D>, x, a, y, alignedCopy);
+    return InErrWithHost(err, qx::VectorTimesMatrix<DBL2D, DBL1D>, x, a, y, alignedCopy != 0);
 }
 int32_t vectxA_head(DBL1D x, DBL2D a, DBL1D y, ErrorCode *err) {
     return vectxAAligned_head(x, a, y, 0, err);
 }
 int32_t CxVectxAAligned_head(CDB1D x, CDB2D a, CDB1D y, int32_t alignedCopy, ErrorCode *err) {
-    return InErrWithHost(err, qx::VectorTimesMatrix<CDB2D, CDB1D>, x, a, y, alignedCopy);
+    return InErrWithHost(err, qx::VectorTimesMatrix<CDB2D, CDB1D>, x, a, y, alignedCopy != 0);
 }
 int32_t CxVectxA_head(CDB1D x, CDB2D a, CDB1D y, ErrorCode *err) {
     return CxVectxAAligned_head(x, a, y, 0, err);

@@ -1,34 +1,29 @@
 #include "qx/matrix_properties.h"
 
-#include "frame/export.h"
+#include "linalg/exports/checks.h"
 #include "linalg/properties/definiteness.h"
 #include "linalg/properties/scalars.h"
 #include "linalg/properties/special.h"
 #include "linalg/properties/vectors.h"
-#include "linalg/scalar.h"
 
 namespace qx {
 namespace {
 
 // The element of a handle type as an output: DBL or CDB.
 template <class Handle>
-using OutElement = OutValue<typename ScalarOf<HandleTraits<Handle>::code>::type>;
+using OutElement = OutValue<typename ScalarOf<elementOf<Handle>>::type>;
 
-template <class Matrix>
-ErrorCode SquareFirst(In<Matrix> a) {
-    return FirstFailed({{a.isEmpty(), ErrEmptyInput}, {!a.isSquare(), ErrNotSquare}});
-}
-// kept: the older exports let the last failed check decide.
-template <class Matrix>
-ErrorCode SquareLast(In<Matrix> a) {
-    return LastFailed({{a.isEmpty(), ErrEmptyInput}, {!a.isSquare(), ErrNotSquare}});
+bool IsNoType(int32_t type) {
+    return type < int32_t(MatrixType::general) || type > int32_t(MatrixType::upperTriangular);
 }
 
 template <class Matrix>
 Outcome Determinant(In<Matrix> a, int32_t matrixType, OutElement<Matrix> det) {
     if (const Outcome bad = SquareLast(a))
         return bad;
-    return MatrixDeterminant(a.data(), a.rows(), matrixType, det.address());
+    if (IsNoType(matrixType))
+        return ErrInvalidSelector;
+    return MatrixDeterminant<elementOf<Matrix>>(a.view(), MatrixType{matrixType}, det.address());
 }
 
 // kept: the rank is -1 after a failure.
@@ -37,30 +32,31 @@ Outcome Rank(In<Matrix> a, double tolerance, int32_t *rank) {
     *rank = -1;
     if (a.isEmpty())
         return ErrEmptyInput;
-    return MatrixRank(a.data(), a.rows(), a.cols(), tolerance, rank);
+    return MatrixRank<elementOf<Matrix>>(a.view(), tolerance, rank);
 }
 
 template <class Matrix>
 Outcome Condition(In<Matrix> a, int32_t normType, OutDBL cond) {
     if (a.isEmpty())
         return ErrEmptyInput;
-    return ConditionNumber(a.data(), a.rows(), a.cols(), normType, cond.address());
+    return ConditionNumber<elementOf<Matrix>>(a.view(), normType, cond.address());
 }
 
 template <class Matrix>
 Outcome Norm(In<Matrix> a, int32_t normType, OutDBL norm) {
     if (a.isEmpty())
         return ErrEmptyInput;
-    return MatrixNorm(a.data(), a.rows(), a.cols(), normType, norm.address());
+    return MatrixNorm<elementOf<Matrix>>(a.view(), normType, norm.address());
 }
 
 template <class Matrix>
 Outcome Trace(In<Matrix> a, OutElement<Matrix> trace) {
     if (const Outcome bad = SquareLast(a))
         return bad;
-    auto sum = ScalarOf<HandleTraits<Matrix>::code>::Of(0.0);
-    for (std::ptrdiff_t i = 0; i < a.rows(); ++i)
-        sum = sum + a.data()[i * a.rows() + i];
+    const auto elements = a.view();
+    auto sum = ScalarOf<elementOf<Matrix>>::Of(0.0);
+    for (int32_t i = 0; i < elements.rows(); ++i)
+        sum = sum + elements(i, i);
     trace = sum;
     return 0;
 }
@@ -70,42 +66,59 @@ Outcome DotProduct(In<Vector> x, In<Vector> y, OutElement<Vector> dot) {
     if (const Outcome bad = LastFailed(
             {{x.isEmpty() || y.isEmpty(), ErrEmptyInput}, {x.size() != y.size(), ErrSizeMismatch}}))
         return bad;
-    auto sum = ScalarOf<HandleTraits<Vector>::code>::Of(0.0);
+    auto sum = ScalarOf<elementOf<Vector>>::Of(0.0);
     for (int32_t i = 0; i < x.size(); ++i)
         sum = sum + x.data()[i] * y.data()[i];
     dot = sum;
     return 0;
 }
 
-// The norm alone never writes into the vector.
+template <class Vector>
+ErrorCode CheckNorm(const Block<Vector> &x, double p) {
+    return FirstFailed(
+        {{x.isEmpty(), ErrEmptyInput}, {p != p, ErrNonFiniteInput}, {p == 0.0, ErrTooFewWeights}});
+}
 template <class Vector>
 Outcome NormOfVector(In<Vector> x, double p, OutDBL norm) {
-    typedef typename HandleTraits<Vector>::T T;
-    return VectorNorm(const_cast<T *>(x.data()), x.size(), p, norm.address(), 0);
+    if (const ErrorCode bad = CheckNorm(x, p))
+        return bad;
+    norm = VectorNorm<elementOf<Vector>>(x.view(), p);
+    return 0;
 }
+// A norm of 0, and one that is not finite, leaves the vector as it is.
 template <class Vector>
 Outcome UnitVector(InOut<Vector> x, double p, OutDBL norm) {
-    return VectorNorm(x.data(), x.size(), p, norm.address(), 1);
+    if (const ErrorCode bad = CheckNorm(x, p))
+        return bad;
+    const double size = VectorNorm<elementOf<Vector>>(x.view(), p);
+    norm = size;
+    if (size == 0.0 || !(size < std::numeric_limits<double>::infinity()))
+        return 0;
+    const double reciprocal = 1.0 / size;
+    for (ElementOf<elementOf<Vector>> &element : x.view())
+        element = element * reciprocal;
+    return 0;
 }
 
-Outcome TestSymmetry(In<DBL2D> a, double tolerance, int32_t relative, OutI32 isSymmetric) {
+Outcome TestSymmetry(In<DBL2D> a, double tolerance, bool relative, OutI32 isSymmetric) {
     if (const Outcome bad = SquareFirst(a))
         return bad;
-    return CheckSymmetric(a.data(), a.rows(), tolerance, relative, isSymmetric.address());
+    return CheckSymmetric<ElementType::DBL>(a.view(), tolerance, relative, false,
+                                            isSymmetric.address());
 }
-Outcome CxTestSymmetry(In<CDB2D> a, double tolerance, int32_t relative, int32_t hermitian,
+Outcome CxTestSymmetry(In<CDB2D> a, double tolerance, bool relative, bool isHermitian,
                        OutI32 isSymmetric) {
     if (const Outcome bad = SquareFirst(a))
         return bad;
-    return CheckSymmetric(a.data(), a.rows(), tolerance, relative, hermitian,
-                          isSymmetric.address());
+    return CheckSymmetric<ElementType::CDB>(a.view(), tolerance, relative, isHermitian,
+                                            isSymmetric.address());
 }
 
 template <class Matrix>
 Outcome TestDefiniteness(In<Matrix> a, OutI32 isDefinite) {
     if (const Outcome bad = SquareLast(a))
         return bad;
-    return CheckPositiveDefinite(a.data(), a.rows(), isDefinite.address());
+    return CheckPositiveDefinite<elementOf<Matrix>>(a.view(), isDefinite.address());
 }
 
 // kept: the rank is -1 after a failure.
@@ -114,7 +127,8 @@ Outcome TestSemiDefiniteness(In<Matrix> a, double tolerance, OutI32 isSemiDefini
     *rank = -1;
     if (const Outcome bad = SquareFirst(a))
         return bad;
-    return CheckPositiveSemiDefinite(a.data(), a.rows(), tolerance, isSemiDefinite.address(), rank);
+    return CheckPositiveSemiDefinite<elementOf<Matrix>>(a.view(), tolerance,
+                                                        isSemiDefinite.address(), rank);
 }
 
 template <class Matrix, class Vector>
@@ -125,7 +139,7 @@ Outcome Polynomial(In<Matrix> a, Out<Vector> poly) {
         return ErrOutOfMemory;
     if (const Outcome bad = poly.resize(a.rows() + 1))
         return bad;
-    return CharacteristicPolynomial(a.data(), a.rows(), poly.data());
+    return CharacteristicPolynomial<elementOf<Matrix>>(a.view(), poly.view());
 }
 
 } // namespace
@@ -191,11 +205,11 @@ int32_t CxUnitVector80_head(CDB1D x, double p, DBL *norm, ErrorCode *err) {
 }
 
 ErrorCode CheckSym_head(DBL2D a, double tolerance, int32_t relative, int32_t *isSymmetric) {
-    return Returned(qx::TestSymmetry, a, tolerance, relative, isSymmetric);
+    return Returned(qx::TestSymmetry, a, tolerance, relative != 0, isSymmetric);
 }
 ErrorCode CxCheckSym_head(CDB2D a, double tolerance, int32_t relative, int32_t hermitian,
                           int32_t *isSymmetric) {
-    return Returned(qx::CxTestSymmetry, a, tolerance, relative, hermitian, isSymmetric);
+    return Returned(qx::CxTestSymmetry, a, tolerance, relative != 0, hermitian != 0, isSymmetric);
 }
 int32_t CheckPosdef_head(DBL2D a, int32_t *isPositiveDefinite, ErrorCode *err) {
     return InErr(err, qx::TestDefiniteness<DBL2D>, a, isPositiveDefinite);

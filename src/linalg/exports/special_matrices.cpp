@@ -1,7 +1,6 @@
 #include "qx/special_matrices.h"
 
-#include "frame/export.h"
-#include "linalg/matrix.h"
+#include "linalg/exports/checks.h"
 #include "linalg/properties/special.h"
 
 namespace qx {
@@ -37,21 +36,22 @@ Outcome MakeKind(int32_t kind, int32_t size, In<Vector> x, In<Vector> y, Out<Mat
         return bad;
     if (const Outcome bad = out.resize(shape.rows, shape.cols))
         return bad;
+    constexpr ElementType E = elementOf<Matrix>;
     switch (kind) {
     case identity:
-        FillIdentity(out.data(), size);
+        SetIdentity<E>(out.view());
         return 0;
     case diagonal:
-        FillDiagonal(x.data(), x.size(), out.data());
+        FillDiagonal<E>(x.view(), out.view());
         return 0;
     case toeplitz:
-        FillToeplitz(x.data(), x.size(), y.data(), y.size(), out.data());
+        FillToeplitz<E>(x.view(), y.view(), out.view());
         return 0;
     case vandermonde:
-        FillVandermonde(x.data(), x.size(), out.data());
+        FillVandermonde<E>(x.view(), out.view());
         return 0;
     default:
-        FillCompanion(x.data(), shape.rows, out.data());
+        FillCompanion<E>(x.view(), out.view());
         return 0;
     }
 }
@@ -60,12 +60,12 @@ template <class Vector, class Matrix>
 Outcome OuterProduct(In<Vector> x, In<Vector> y, Out<Matrix> out) {
     if (x.isEmpty() || y.isEmpty())
         return ErrEmptyInput;
-    const int32_t n = y.size();
-    if (const Outcome bad = out.resize(x.size(), n))
+    if (const Outcome bad = out.resize(x.size(), y.size()))
         return bad;
-    for (std::ptrdiff_t i = 0; i < x.size(); ++i)
-        for (std::ptrdiff_t j = 0; j < n; ++j)
-            out.data()[i * n + j] = x.data()[i] * y.data()[j];
+    const auto product = out.view();
+    for (int32_t i = 0; i < product.rows(); ++i)
+        for (int32_t j = 0; j < product.cols(); ++j)
+            product(i, j) = x.data()[i] * y.data()[j];
     return 0;
 }
 
@@ -78,11 +78,12 @@ Outcome KroneckerProduct(In<Matrix> a, In<Matrix> b, Out<Matrix> out) {
         return ErrOutOfMemory;
     if (const Outcome bad = out.resize(static_cast<int32_t>(rows), static_cast<int32_t>(cols)))
         return bad;
-    typename Out<Matrix>::T *element = out.data();
-    for (std::ptrdiff_t i = 0; i < rows; ++i)
-        for (std::ptrdiff_t j = 0; j < cols; ++j)
-            *element++ = a.data()[i / b.rows() * a.cols() + j / b.cols()] *
-                         b.data()[i % b.rows() * b.cols() + j % b.cols()];
+    const auto left = a.view(), right = b.view();
+    const auto product = out.view();
+    for (int32_t i = 0; i < product.rows(); ++i)
+        for (int32_t j = 0; j < product.cols(); ++j)
+            product(i, j) = left(i / right.rows(), j / right.cols()) *
+                            right(i % right.rows(), j % right.cols());
     return 0;
 }
 
@@ -95,7 +96,7 @@ Outcome Expand(In<Vector> packed, int32_t triangle, Out<Matrix> out) {
         return 0;
     if (const Outcome bad = out.resize(n, n))
         return bad;
-    ExpandPacked(packed.data(), n, triangle, out.data());
+    ExpandPacked<elementOf<Vector>>(packed.view(), Triangle{triangle}, out.view());
     return 0;
 }
 
@@ -110,7 +111,7 @@ Outcome Pack(In<Matrix> a, int32_t triangle, Out<Vector> packed) {
         return bad;
     if (const Outcome bad = packed.resize(static_cast<int32_t>(length)))
         return bad;
-    PackMatrix(a.data(), a.rows(), triangle, packed.data());
+    PackMatrix<elementOf<Matrix>>(a.view(), Triangle{triangle}, packed.view());
     return 0;
 }
 
@@ -120,7 +121,7 @@ Outcome Transposed(In<Matrix> a, Out<Matrix> out) {
         return ErrEmptyInput;
     if (const Outcome bad = out.resize(a.cols(), a.rows()))
         return bad;
-    TransposeInto(a.data(), a.rows(), a.cols(), out.data());
+    CopyTransposed<elementOf<Matrix>>(a.view(), out.view());
     return 0;
 }
 
@@ -146,7 +147,7 @@ Outcome FromEigenvalues(In<DBL1D> values, Out<DBL2D> out) {
         return ErrEmptyInput;
     if (const Outcome bad = out.resize(values.size(), values.size()))
         return bad;
-    FillWithEigenvalues(values.data(), values.size(), out.data());
+    FillWithEigenvalues(values.view(), out.view());
     return 0;
 }
 
@@ -161,7 +162,8 @@ Outcome Correlations(In<Vector> x, In<Vector> y, int32_t maxLag, int32_t normali
         return bad;
     if (const Outcome bad = out.resize(maxLag + 1, maxLag + 1))
         return bad;
-    return CorrelationMatrix(x.data(), y.data(), x.size(), maxLag, normalization, out.data());
+    return CorrelationMatrix<elementOf<Vector>>(x.view(), y.view(), CorrelationScale{normalization},
+                                                out.view());
 }
 
 } // namespace

@@ -10,8 +10,8 @@ class Balancing {
     typedef ElementOf<E> T;
 
 public:
-    Balancing(T *a, std::ptrdiff_t stride, int32_t n, DBL *scale)
-        : a_(a), stride_(stride), n_(n), high_(n - 1), scale_(scale) {}
+    Balancing(MatrixView<E> a, RealVector scale)
+        : a_(a), n_(a.rows()), high_(n_ - 1), scale_(scale) {}
 
     void permute() {
         for (int32_t j = high_; j >= 0 && high_ > 0;) {
@@ -45,7 +45,7 @@ public:
     Balanced range() const { return {low_, high_}; }
 
 private:
-    T *at(int32_t row) const { return a_ + row * stride_; }
+    T *at(int32_t row) const { return a_.row(row); }
 
     bool rowIsZeroBut(int32_t j) const {
         for (int32_t i = 0; i <= high_; ++i)
@@ -120,18 +120,17 @@ private:
 
     static constexpr double least = 0x1p-970;
 
-    T *a_;
-    std::ptrdiff_t stride_;
+    MatrixView<E> a_;
     int32_t n_, low_ = 0, high_;
-    DBL *scale_;
+    RealVector scale_;
 };
 
 } // namespace
 
 template <ElementType E>
-Balanced Balance(ElementOf<E> *a, std::ptrdiff_t stride, int32_t n, bool permute, bool scaleToo,
-                 DBL *scale) {
-    Balancing<E> balancing(a, stride, n, scale);
+Balanced Balance(MatrixView<E> a, bool permute, bool scaleToo, RealVector scale) {
+    QX_EXPECTS(a.isSquare() && scale.size() == a.rows());
+    Balancing<E> balancing(a, scale);
     if (permute)
         balancing.permute();
     const Balanced range = balancing.range();
@@ -145,40 +144,34 @@ Balanced Balance(ElementOf<E> *a, std::ptrdiff_t stride, int32_t n, bool permute
 }
 
 template <ElementType E>
-void UndoScaling(const DBL *scale, Balanced range, EigenvectorSide side, ElementOf<E> *v,
-                 std::ptrdiff_t stride, int32_t cols) {
+void UndoScaling(ConstRealVector scale, Balanced range, EigenvectorSide side, MatrixView<E> v) {
     if (range.low == range.high)
         return;
     for (int32_t i = range.low; i <= range.high; ++i) {
         const double factor = side == EigenvectorSide::Right ? scale[i] : 1.0 / scale[i];
-        for (int32_t j = 0; j < cols; ++j)
-            v[i * stride + j] = v[i * stride + j] * factor;
+        for (int32_t j = 0; j < v.cols(); ++j)
+            v(i, j) = v(i, j) * factor;
     }
 }
 
 template <ElementType E>
-void UndoPermutation(const DBL *scale, Balanced range, int32_t n, ElementOf<E> *v,
-                     std::ptrdiff_t stride, int32_t cols) {
+void UndoPermutation(ConstRealVector scale, Balanced range, MatrixView<E> v) {
     const auto exchange = [=](int32_t i) {
         const auto other = static_cast<int32_t>(scale[i]);
-        for (int32_t j = 0; other != i && j < cols; ++j)
-            Swap(&v[i * stride + j], &v[other * stride + j]);
+        for (int32_t j = 0; other != i && j < v.cols(); ++j)
+            Swap(&v(i, j), &v(other, j));
     };
     for (int32_t i = range.low - 1; i >= 0; --i)
         exchange(i);
-    for (int32_t i = range.high + 1; i < n; ++i)
+    for (int32_t i = range.high + 1; i < v.rows(); ++i)
         exchange(i);
 }
 
-template Balanced Balance<ElementType::DBL>(DBL *, std::ptrdiff_t, int32_t, bool, bool, DBL *);
-template Balanced Balance<ElementType::CDB>(CDB *, std::ptrdiff_t, int32_t, bool, bool, DBL *);
-template void UndoScaling<ElementType::DBL>(const DBL *, Balanced, EigenvectorSide, DBL *,
-                                            std::ptrdiff_t, int32_t);
-template void UndoScaling<ElementType::CDB>(const DBL *, Balanced, EigenvectorSide, CDB *,
-                                            std::ptrdiff_t, int32_t);
-template void UndoPermutation<ElementType::DBL>(const DBL *, Balanced, int32_t, DBL *,
-                                                std::ptrdiff_t, int32_t);
-template void UndoPermutation<ElementType::CDB>(const DBL *, Balanced, int32_t, CDB *,
-                                                std::ptrdiff_t, int32_t);
+template Balanced Balance(RealMatrix, bool, bool, RealVector);
+template Balanced Balance(ComplexMatrix, bool, bool, RealVector);
+template void UndoScaling(ConstRealVector, Balanced, EigenvectorSide, RealMatrix);
+template void UndoScaling(ConstRealVector, Balanced, EigenvectorSide, ComplexMatrix);
+template void UndoPermutation(ConstRealVector, Balanced, RealMatrix);
+template void UndoPermutation(ConstRealVector, Balanced, ComplexMatrix);
 
 } // namespace qx

@@ -1,7 +1,7 @@
 #ifndef QX_LINALG_FACTORISATIONS_BALANCE_H
 #define QX_LINALG_FACTORISATIONS_BALANCE_H
 
-#include "linalg/scalar.h"
+#include "linalg/matrix.h"
 
 namespace qx {
 
@@ -16,18 +16,15 @@ struct Balanced {
     int32_t low, high;
 };
 template <ElementType E>
-Balanced Balance(ElementOf<E> *a, std::ptrdiff_t stride, int32_t n, bool permute, bool scaleToo,
-                 DBL *scale);
+Balanced Balance(MatrixView<E> a, bool permute, bool scaleToo, RealVector scale);
 
-// Eigenvectors of the balanced matrix, in the columns of the n by cols matrix v, become those of
-// the original one: factors, then exchanges. Left eigenvectors take the inverse factors.
+// Eigenvectors of the balanced matrix, in the columns of v, become those of the original one:
+// factors, then exchanges. Left eigenvectors take the inverse factors.
 enum class EigenvectorSide { Right, Left };
 template <ElementType E>
-void UndoScaling(const DBL *scale, Balanced range, EigenvectorSide side, ElementOf<E> *v,
-                 std::ptrdiff_t stride, int32_t cols);
+void UndoScaling(ConstRealVector scale, Balanced range, EigenvectorSide side, MatrixView<E> v);
 template <ElementType E>
-void UndoPermutation(const DBL *scale, Balanced range, int32_t n, ElementOf<E> *v,
-                     std::ptrdiff_t stride, int32_t cols);
+void UndoPermutation(ConstRealVector scale, Balanced range, MatrixView<E> v);
 
 } // namespace qx
 

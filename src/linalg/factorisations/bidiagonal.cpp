@@ -1,7 +1,6 @@
 #include "linalg/factorisations/bidiagonal.h"
 
 #include "linalg/scalar.h"
-#include "qx/errors.h"
 
 #include <cmath>
 
@@ -23,9 +22,9 @@ double ScaledHypot(double f, double g) {
 
 class Bidiagonal {
 public:
-    Bidiagonal(DBL *d, DBL *e, int32_t n, RotationQueue &left, RotationQueue &right)
-        : d_(d), e_(e), n_(n), left_(left), right_(right) {
-        for (int32_t i = 0; i < n; ++i) {
+    Bidiagonal(RealVector d, RealVector e, RotationQueue &left, RotationQueue &right)
+        : d_(d), e_(e), n_(static_cast<int32_t>(d.size())), left_(left), right_(right) {
+        for (int32_t i = 0; i < n_; ++i) {
             const double sum = std::fabs(d[i]) + std::fabs(e[i]);
             if (sum > norm_)
                 norm_ = sum;
@@ -123,7 +122,7 @@ private:
         return f;
     }
 
-    DBL *d_, *e_;
+    RealVector d_, e_;
     int32_t n_;
     double norm_ = 0.0;
     RotationQueue &left_, &right_;
@@ -131,9 +130,9 @@ private:
 
 } // namespace
 
-ErrorCode DiagonaliseBidiagonal(DBL *d, DBL *e, int32_t n, RotationQueue &left,
+ErrorCode DiagonaliseBidiagonal(RealVector d, RealVector e, RotationQueue &left,
                                 RotationQueue &right) {
-    const ErrorCode status = Bidiagonal(d, e, n, left, right).diagonalise();
+    const ErrorCode status = Bidiagonal(d, e, left, right).diagonalise();
     left.flush();
     right.flush();
     return status;

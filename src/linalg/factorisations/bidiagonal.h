@@ -2,7 +2,7 @@
 #define QX_LINALG_FACTORISATIONS_BIDIAGONAL_H
 
 #include "linalg/factorisations/rotations.h"
-#include "qx/types.h"
+#include "qx/errors.h"
 
 namespace qx {
 
@@ -12,7 +12,7 @@ inline constexpr int32_t SVDIterationLimit = 100;
 // Makes the upper bidiagonal matrix with diagonal d and e[i] at row i - 1, column i (e[0] is 0)
 // diagonal. The rotations go to `left` and `right`, which hold the transposed factors. d may come
 // out negative. ErrIterationLimit.
-ErrorCode DiagonaliseBidiagonal(DBL *d, DBL *e, int32_t n, RotationQueue &left,
+ErrorCode DiagonaliseBidiagonal(RealVector d, RealVector e, RotationQueue &left,
                                 RotationQueue &right);
 
 } // namespace qx

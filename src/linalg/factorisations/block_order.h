@@ -1,10 +1,8 @@
 #ifndef QX_LINALG_FACTORISATIONS_BLOCK_ORDER_H
 #define QX_LINALG_FACTORISATIONS_BLOCK_ORDER_H
 
-#include "frame/scratch.h"
 #include "linalg/factorisations/schur.h"
 #include "linalg/lapack.h"
-#include "linalg/scalar.h"
 
 namespace qx {
 
@@ -22,12 +20,9 @@ inline ErrorCode CodeOfSchur(int32_t info, int32_t n) {
 // The blocks along the diagonal of a Schur form, each with the number by which it is ordered.
 class BlockOrder {
 public:
-    ErrorCode allocate(int32_t n) {
-        const ErrorCode failed = sizes_.allocate(n);
-        return failed != 0 ? failed : keys_.allocate(n);
-    }
+    ErrorCode allocate(int32_t n) { return memory_.take(Sized(keys_, n), Sized(sizes_, n)); }
 
-    void add(double real, double modulus, int32_t size, int32_t order) {
+    void add(double real, double modulus, int32_t size, SchurOrder order) {
         const double key = order >= schurModulusAscending ? modulus : real;
         const bool descends = order == schurRealDescending || order == schurModulusDescending;
         keys_[count_] = descends ? -key : key;
@@ -58,8 +53,9 @@ public:
 
 private:
     int32_t count_ = 0;
-    Scratch<ElementType::DBL> keys_;
-    Scratch<ElementType::I32> sizes_;
+    ScratchParts memory_;
+    RealVector keys_;
+    IndexVector sizes_;
 };
 
 } // namespace qx

@@ -1,7 +1,6 @@
 #include "linalg/factorisations/cholesky.h"
 
 #include "linalg/kernels.h"
-#include "linalg/matrix.h"
 
 #include <algorithm>
 #include <cmath>
@@ -24,34 +23,7 @@ template <ElementType E>
 void AddMultiple(ElementOf<E> *y, typename ScalarOf<E>::type factor, const ElementOf<E> *x,
                  int32_t n) {
     const ElementOf<E> f = factor;
-    AddOuterProduct(y, 0, 1, n, &f, x);
-}
-
-template <ElementType E>
-ErrorCode Factor(ElementOf<E> *packed, int32_t n) {
-    ErrorCode status = 0;
-    double largest = 0.0, least = HUGE_VAL;
-    for (int32_t k = 0; k < n; ++k) {
-        ElementOf<E> *const column = LowerColumn<E>(packed, n, k);
-        for (int32_t j = 0; j < k; ++j) {
-            const ElementOf<E> *const before = LowerColumn<E>(packed, n, j);
-            AddMultiple<E>(column + k, -Conj(before[k]), before + k, n - k);
-        }
-        const double pivot = RealPart(column[k]);
-        if (!(pivot > 0.0))
-            return ErrNotPositiveDefinite;
-        const double root = std::sqrt(pivot);
-        column[k] = ScalarOf<E>::Of(root);
-        least = std::min(least, root);
-        largest = std::max(largest, root);
-        for (int32_t i = k + 1; i < n; ++i) {
-            column[i] = column[i] / root;
-            largest = std::max(largest, Modulus(column[i]));
-        }
-        if (least < 0x1p-26 * largest)
-            status = ErrNotPositiveDefinite;
-    }
-    return status;
+    AddOuterProduct<E>({y, 1, n}, {&f, 1}, {x, n});
 }
 
 // Column j of the inverse of a lower triangle solves l x = e_j, so it needs the columns from j on
@@ -85,8 +57,41 @@ void InvertUpper(ElementOf<E> *packed, int32_t n) {
     }
 }
 
+} // namespace
+
 template <ElementType E>
-ErrorCode InvertFactor(ElementOf<E> *packed, int32_t n) {
+ErrorCode PackedCholesky(VectorView<E> triangle, int32_t n) {
+    QX_EXPECTS(triangle.size() >= PackedLength(n));
+    ElementOf<E> *const packed = triangle.data();
+    ErrorCode status = 0;
+    double largest = 0.0, least = HUGE_VAL;
+    for (int32_t k = 0; k < n; ++k) {
+        ElementOf<E> *const column = LowerColumn<E>(packed, n, k);
+        for (int32_t j = 0; j < k; ++j) {
+            const ElementOf<E> *const before = LowerColumn<E>(packed, n, j);
+            AddMultiple<E>(column + k, -Conj(before[k]), before + k, n - k);
+        }
+        const double pivot = RealPart(column[k]);
+        if (!(pivot > 0.0))
+            return ErrNotPositiveDefinite;
+        const double root = std::sqrt(pivot);
+        column[k] = ScalarOf<E>::Of(root);
+        least = std::min(least, root);
+        largest = std::max(largest, root);
+        for (int32_t i = k + 1; i < n; ++i) {
+            column[i] = column[i] / root;
+            largest = std::max(largest, Modulus(column[i]));
+        }
+        if (least < 0x1p-26 * largest)
+            status = ErrNotPositiveDefinite;
+    }
+    return status;
+}
+
+template <ElementType E>
+ErrorCode InvertFromCholesky(VectorView<E> triangle, int32_t n) {
+    QX_EXPECTS(triangle.size() >= PackedLength(n));
+    ElementOf<E> *const packed = triangle.data();
     for (int32_t j = 0; j < n; ++j)
         if (AbsSum(LowerColumn<E>(packed, n, j)[j]) == 0.0)
             return ErrSingularMatrix;
@@ -106,13 +111,15 @@ ErrorCode InvertFactor(ElementOf<E> *packed, int32_t n) {
 }
 
 template <ElementType E>
-ErrorCode Invert(ElementOf<E> *packed, int32_t n, int32_t triangle) {
-    const int64_t length = PackedLength(n);
-    if (CheckFinite(packed, length) != 0)
+ErrorCode InvertTriangle(VectorView<E> elements, int32_t n, Triangle triangle) {
+    QX_EXPECTS(elements.size() == PackedLength(n));
+    QX_EXPECTS(triangle == lowerTriangle || triangle == upperTriangle);
+    if (!AllFinite<E>(elements))
         return ErrNonFiniteInput;
     double largest = 0.0;
-    for (int64_t i = 0; i < length; ++i)
-        largest = std::max(largest, Modulus(packed[i]));
+    for (const ElementOf<E> &element : elements)
+        largest = std::max(largest, Modulus(element));
+    ElementOf<E> *const packed = elements.data();
     const bool isUpper = triangle == upperTriangle;
     for (int32_t j = 0; j < n; ++j) {
         const ElementOf<E> *const column =
@@ -124,23 +131,11 @@ ErrorCode Invert(ElementOf<E> *packed, int32_t n, int32_t triangle) {
     return 0;
 }
 
-} // namespace
-
-ErrorCode PackedCholesky(DBL *packed, int32_t n) { return Factor<ElementType::DBL>(packed, n); }
-ErrorCode PackedCholesky(CDB *packed, int32_t n) { return Factor<ElementType::CDB>(packed, n); }
-
-ErrorCode InvertFromCholesky(DBL *packed, int32_t n) {
-    return InvertFactor<ElementType::DBL>(packed, n);
-}
-ErrorCode InvertFromCholesky(CDB *packed, int32_t n) {
-    return InvertFactor<ElementType::CDB>(packed, n);
-}
-
-ErrorCode InvertTriangle(DBL *packed, int32_t n, int32_t triangle) {
-    return Invert<ElementType::DBL>(packed, n, triangle);
-}
-ErrorCode InvertTriangle(CDB *packed, int32_t n, int32_t triangle) {
-    return Invert<ElementType::CDB>(packed, n, triangle);
-}
+template ErrorCode PackedCholesky(RealVector, int32_t);
+template ErrorCode PackedCholesky(ComplexVector, int32_t);
+template ErrorCode InvertFromCholesky(RealVector, int32_t);
+template ErrorCode InvertFromCholesky(ComplexVector, int32_t);
+template ErrorCode InvertTriangle(RealVector, int32_t, Triangle);
+template ErrorCode InvertTriangle(ComplexVector, int32_t, Triangle);
 
 } // namespace qx

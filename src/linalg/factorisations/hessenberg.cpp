@@ -1,55 +1,51 @@
 #include "linalg/factorisations/hessenberg.h"
 
-#include "frame/scratch.h"
 #include "linalg/factorisations/reflector.h"
 
 namespace qx {
 
 template <ElementType E>
-ErrorCode ReduceToHessenberg(ElementOf<E> *a, std::ptrdiff_t stride, int32_t n, int32_t low,
-                             int32_t high, ElementOf<E> *q, std::ptrdiff_t qStride) {
+ErrorCode ReduceToHessenberg(MatrixView<E> a, int32_t low, int32_t high, MatrixView<E> q) {
     typedef ElementOf<E> T;
     typedef Reflector<E> Reflection;
-    Scratch<E> vectors;
-    if (const ErrorCode failed = vectors.allocate(5 * int64_t{n}))
+    const int32_t n = a.rows();
+    QX_EXPECTS(a.isSquare() && low >= 0 && high < n && (q.isEmpty() || q.rows() == n));
+    VectorView<E> kappa, first, column, work;
+    ScratchParts memory;
+    if (const ErrorCode failed = memory.take(Sized(kappa, n), Sized(first, n), Sized(column, n),
+                                             Sized(work, 2 * int64_t{n})))
         return failed;
-    T *const kappa = vectors.data(), *const first = kappa + n, *const v = first + n,
-             *const work = v + n;
 
     for (int32_t k = low; k < high - 1; ++k) {
         const int32_t rows = high - k;
-        T *const column = a + (k + 1) * stride + k;
-        const Reflection reflection(column, stride, rows, Reflection::Leave::Reduced);
+        T *const below = a.row(k + 1) + k;
+        const Reflection reflection(below, a.stride(), rows, Reflection::Leave::Reduced);
         kappa[k] = reflection.kappa;
+        const VectorView<E> v = column.part(0, rows);
         for (int32_t i = 0; i < rows; ++i)
-            v[i] = column[i * stride];
+            v[i] = a(k + 1 + i, k);
         first[k] = v[0];
-        column[0] = ScalarOf<E>::Of(reflection.beta);
-        ReflectFromLeft<E>(column + 1, stride, rows, n - k - 1, v, reflection.kappa, work);
-        ReflectFromRight<E>(a + k + 1, stride, high + 1, rows, v, Conj(reflection.kappa), work);
+        *below = ScalarOf<E>::Of(reflection.beta);
+        ReflectFromLeft<E>(a.block(k + 1, k + 1, rows, n - k - 1), v, reflection.kappa, work);
+        ReflectFromRight<E>(a.block(0, k + 1, high + 1, rows), v, Conj(reflection.kappa), work);
     }
 
-    for (int32_t i = 0; q != nullptr && i < n; ++i)
-        for (int32_t j = 0; j < n; ++j)
-            q[i * qStride + j] = ScalarOf<E>::Of(i == j ? 1.0 : 0.0);
+    SetIdentity<E>(q);
     for (int32_t k = high - 2; k >= low; --k) {
-        T *const column = a + (k + 1) * stride + k;
         const int32_t rows = high - k;
+        const VectorView<E> v = column.part(0, rows);
         v[0] = first[k];
         for (int32_t i = 1; i < rows; ++i) {
-            v[i] = column[i * stride];
-            column[i * stride] = T{};
+            v[i] = a(k + 1 + i, k);
+            a(k + 1 + i, k) = T{};
         }
-        if (q != nullptr)
-            ReflectFromLeft<E>(q + (k + 1) * qStride + k + 1, qStride, rows, rows, v,
-                               Conj(kappa[k]), work);
+        if (!q.isEmpty())
+            ReflectFromLeft<E>(q.block(k + 1, k + 1, rows, rows), v, Conj(kappa[k]), work);
     }
     return 0;
 }
 
-template ErrorCode ReduceToHessenberg<ElementType::DBL>(DBL *, std::ptrdiff_t, int32_t, int32_t,
-                                                        int32_t, DBL *, std::ptrdiff_t);
-template ErrorCode ReduceToHessenberg<ElementType::CDB>(CDB *, std::ptrdiff_t, int32_t, int32_t,
-                                                        int32_t, CDB *, std::ptrdiff_t);
+template ErrorCode ReduceToHessenberg(RealMatrix, int32_t, int32_t, RealMatrix);
+template ErrorCode ReduceToHessenberg(ComplexMatrix, int32_t, int32_t, ComplexMatrix);
 
 } // namespace qx

@@ -1,9 +1,6 @@
 #include "linalg/factorisations/qr.h"
 
-#include "frame/scratch.h"
 #include "linalg/factorisations/reflector.h"
-#include "linalg/matrix.h"
-#include "linalg/transpose.h"
 
 #include <algorithm>
 #include <cmath>
@@ -30,15 +27,14 @@ class HouseholderQR {
     typedef ElementOf<E> T;
 
 public:
-    HouseholderQR(int32_t m, int32_t n)
-        : m_(m), n_(n), count_(std::min(m, n)), stride_(PaddedStride(n)) {}
+    HouseholderQR(int32_t m, int32_t n) : m_(m), n_(n), count_(std::min(m, n)) {}
 
-    ErrorCode take(const T *a) {
-        if (const ErrorCode failed = matrix_.allocate(m_ * int64_t{stride_}))
+    ErrorCode take(ConstMatrixView<E> a) {
+        if (const ErrorCode failed = memory_.take(
+                SizedPadded(matrix_, m_, n_), Sized(kappa_, count_), Sized(first_, count_),
+                Sized(column_, m_), Sized(work_, int64_t{m_} + std::max(m_, n_))))
             return failed;
-        if (const ErrorCode failed = vectors_.allocate(3 * int64_t{m_} + 2 * int64_t{n_}))
-            return failed;
-        CopyMatrix<E>(a, n_, m_, n_, matrix_.data(), stride_);
+        CopyMatrix<E>(a, matrix_);
         return 0;
     }
 
@@ -48,14 +44,14 @@ public:
     }
     // The lengths of the columns below the rows done are brought down from step to step, and made
     // anew where that has cost half their digits (LAPACK's Working Note 176).
-    ErrorCode factorPivoted(I32 *pivots) {
-        Scratch<ElementType::DBL> lengths;
-        if (const ErrorCode failed = lengths.allocate(2 * int64_t{n_}))
+    ErrorCode factorPivoted(IndexVector pivots) {
+        RealVector length, reference;
+        ScratchParts memory;
+        if (const ErrorCode failed = memory.take(Sized(length, n_), Sized(reference, n_)))
             return failed;
-        DBL *const length = lengths.data(), *const reference = length + n_;
         for (int32_t j = 0; j < n_; ++j) {
             pivots[j] = j;
-            length[j] = reference[j] = Length<E>(at(0) + j, stride_, m_);
+            length[j] = reference[j] = Length<E>(at(0) + j, matrix_.stride(), m_);
         }
         for (int32_t k = 0; k < count_; ++k) {
             int32_t pivot = k;
@@ -75,42 +71,37 @@ public:
         return 0;
     }
 
-    void writeR(int32_t rows, T *r) const {
-        for (int32_t i = 0; i < rows; ++i)
+    void writeR(MatrixView<E> r) const {
+        for (int32_t i = 0; i < r.rows(); ++i)
             for (int32_t j = 0; j < n_; ++j)
-                r[i * n_ + j] = j < i ? T{} : at(i)[j];
+                r(i, j) = j < i ? T{} : at(i)[j];
     }
-    // The first `cols` columns of H0^H H1^H ...
-    void writeQ(int32_t cols, T *q) const {
-        for (int32_t i = 0; i < m_; ++i)
-            for (int32_t j = 0; j < cols; ++j)
-                q[i * cols + j] = ScalarOf<E>::Of(i == j ? 1.0 : 0.0);
+    // The first columns of H0^H H1^H ...
+    void writeQ(MatrixView<E> q) const {
+        SetIdentity<E>(q);
         for (int32_t k = count_ - 1; k >= 0; --k) {
-            column()[0] = first()[k];
+            column_[0] = first_[k];
             for (int32_t i = k + 1; i < m_; ++i)
-                column()[i - k] = at(i)[k];
-            ReflectFromLeft<E>(q + k * cols + k, cols, m_ - k, cols - k, column(), Conj(kappa()[k]),
-                               work());
+                column_[i - k] = at(i)[k];
+            ReflectFromLeft<E>(q.block(k, k, m_ - k, q.cols() - k), column_.part(0, m_ - k),
+                               Conj(kappa_[k]), work_);
         }
     }
 
 private:
-    T *at(int32_t row) const { return matrix_.data() + row * stride_; }
-    T *kappa() const { return vectors_.data(); }
-    T *first() const { return vectors_.data() + count_; } // the vectors' elements on the diagonal
-    T *column() const { return vectors_.data() + 2 * count_; }
-    T *work() const { return column() + m_; }
+    T *at(int32_t row) const { return matrix_.row(row); }
 
     void step(int32_t k) {
         typedef Reflector<E> Reflection;
-        const Reflection reflection(at(k) + k, stride_, m_ - k, Reflection::Leave::Reduced);
-        kappa()[k] = reflection.kappa;
+        const Reflection reflection(at(k) + k, matrix_.stride(), m_ - k,
+                                    Reflection::Leave::Reduced);
+        kappa_[k] = reflection.kappa;
         for (int32_t i = k; i < m_; ++i)
-            column()[i - k] = at(i)[k];
-        first()[k] = at(k)[k];
+            column_[i - k] = at(i)[k];
+        first_[k] = at(k)[k];
         at(k)[k] = ScalarOf<E>::Of(reflection.beta);
-        ReflectFromLeft<E>(at(k) + k + 1, stride_, m_ - k, n_ - k - 1, column(), reflection.kappa,
-                           work());
+        ReflectFromLeft<E>(matrix_.block(k, k + 1, m_ - k, n_ - k - 1), column_.part(0, m_ - k),
+                           reflection.kappa, work_);
     }
 
     void exchangeColumns(int32_t i, int32_t j) {
@@ -118,7 +109,7 @@ private:
             Swap(&at(row)[i], &at(row)[j]);
     }
 
-    void shorten(int32_t k, int32_t j, DBL *length, DBL *reference) const {
+    void shorten(int32_t k, int32_t j, RealVector length, RealVector reference) const {
         if (length[j] == 0.0)
             return;
         const double part = Modulus(at(k)[j]) / length[j];
@@ -127,68 +118,46 @@ private:
         if (left * (ratio * ratio) > 0x1p-26)
             length[j] *= std::sqrt(left);
         else
-            length[j] = reference[j] = Length<E>(at(k) + stride_ + j, stride_, m_ - k - 1);
+            length[j] = reference[j] = Length<E>(at(k + 1) + j, matrix_.stride(), m_ - k - 1);
     }
 
     int32_t m_, n_, count_;
-    std::ptrdiff_t stride_;
-    Scratch<E> matrix_, vectors_;
+    ScratchParts memory_;
+    MatrixView<E> matrix_;
+    VectorView<E> kappa_, first_; // the vectors' elements on the diagonal
+    VectorView<E> column_, work_;
 };
-
-template <ElementType E>
-ErrorCode Decompose(const ElementOf<E> *a, int32_t m, int32_t n, int32_t form, I32 *pivots,
-                    ElementOf<E> *q, ElementOf<E> *r) {
-    if (m < 1 || n < 1)
-        return ErrEmptyInput;
-    if (form < qrFull || form > qrOnlyR)
-        return ErrInvalidSelector;
-    if (CheckFinite(a, int64_t{m} * n) != 0)
-        return ErrNonFiniteInput;
-    HouseholderQR<E> qr(m, n);
-    if (const ErrorCode failed = qr.take(a))
-        return failed;
-    if (pivots == nullptr)
-        qr.factor();
-    else if (const ErrorCode failed = qr.factorPivoted(pivots))
-        return failed;
-    const int32_t size = form == qrFull ? m : std::min(m, n);
-    qr.writeR(size, r);
-    if (form != qrOnlyR)
-        qr.writeQ(size, q);
-    return 0;
-}
 
 template <ElementType E>
 class GramSchmidtQR {
     typedef ElementOf<E> T;
 
 public:
-    GramSchmidtQR(int32_t m, GramSchmidt order) : m_(m), order_(order), stride_(PaddedStride(m)) {}
+    GramSchmidtQR(int32_t m, GramSchmidt order) : m_(m), order_(order) {}
     ErrorCode allocate() {
-        if (const ErrorCode failed = basis_.allocate(m_ * int64_t{stride_}))
-            return failed;
-        return vectors_.allocate(4 * int64_t{m_});
+        return memory_.take(SizedPadded(conjugates_, m_, m_), Sized(vector_, m_), Sized(sums_, m_),
+                            Sized(products_, m_), Sized(removed_, m_));
     }
 
-    // Column j of a (n columns) into column j of r.
-    void addColumn(const T *a, int32_t n, int32_t j, T *r) {
+    // Column j of a into column j of r.
+    void addColumn(ConstMatrixView<E> a, int32_t j, MatrixView<E> r) {
         double largest = 0.0;
         for (int32_t i = 0; i < m_; ++i)
-            largest = std::max(largest, AbsSum(a[i * n + j]) * 0.5);
+            largest = std::max(largest, AbsSum(a(i, j)) * 0.5);
         int exponent = 0;
         std::frexp(largest, &exponent);
         for (int32_t i = 0; i < m_; ++i)
-            vector()[i] = ScaledBy(a[i * n + j], -exponent);
-        const double before = Length<E>(vector(), 1, m_);
+            vector_[i] = ScaledBy(a(i, j), -exponent);
+        const double before = Length<E>(vector_.data(), 1, m_);
         const int32_t others = std::min(j, m_);
         project(others);
         for (int32_t i = 0; i < m_; ++i)
-            r[i * n + j] = i < others ? T(ScaledBy(sums()[i], exponent)) : T{};
+            r(i, j) = i < others ? T(ScaledBy(sums_[i], exponent)) : T{};
         if (j >= m_)
             return;
-        const double after = Length<E>(vector(), 1, m_);
+        const double after = Length<E>(vector_.data(), 1, m_);
         if (after > before * (m_ * epsilon)) {
-            r[j * n + j] = ScaledBy(ScalarOf<E>::Of(after), exponent);
+            r(j, j) = ScaledBy(ScalarOf<E>::Of(after), exponent);
             keep(j, after);
         } else {
             addAny(j);
@@ -203,32 +172,25 @@ public:
         for (int32_t i = 0; i < m_; ++i) {
             double along = 0.0;
             for (int32_t k = 0; k < j; ++k)
-                along += SquaredModulus(conjugate(k)[i]);
+                along += SquaredModulus(conjugates_(k, i));
             if (along < least) {
                 least = along;
                 farthest = i;
             }
         }
         for (int32_t i = 0; i < m_; ++i)
-            vector()[i] = ScalarOf<E>::Of(i == farthest ? 1.0 : 0.0);
+            vector_[i] = ScalarOf<E>::Of(i == farthest ? 1.0 : 0.0);
         project(j);
-        keep(j, Length<E>(vector(), 1, m_));
+        keep(j, Length<E>(vector_.data(), 1, m_));
     }
 
-    void writeQ(T *q) const {
+    void writeQ(MatrixView<E> q) const {
         for (int32_t i = 0; i < m_; ++i)
             for (int32_t j = 0; j < m_; ++j)
-                q[i * m_ + j] = Conj(conjugate(j)[i]);
+                q(i, j) = Conj(conjugates_(j, i));
     }
 
 private:
-    // The basis stands in rows, conjugated.
-    T *conjugate(int32_t row) const { return basis_.data() + row * stride_; }
-    T *vector() const { return vectors_.data(); }
-    T *sums() const { return vectors_.data() + m_; }
-    T *products() const { return vectors_.data() + 2 * m_; }
-    T *removed() const { return vectors_.data() + 3 * m_; }
-
     template <class Value>
     static auto ScaledBy(Value value, int exponent) {
         if constexpr (E == ElementType::DBL)
@@ -241,7 +203,7 @@ private:
     // classical order all at once, in the modified order one after the other.
     void project(int32_t count) {
         for (int32_t i = 0; i < count; ++i)
-            sums()[i] = T{};
+            sums_[i] = T{};
         for (int pass = 0; pass < 2; ++pass) {
             if (order_ == GramSchmidt::Classical)
                 projectOn(0, count);
@@ -253,67 +215,96 @@ private:
     void projectOn(int32_t from, int32_t count) {
         if (count < 1)
             return;
-        RowProducts(conjugate(from), stride_, count, m_, vector(), products());
+        const ConstMatrixView<E> basis = conjugates_.block(from, 0, count, m_);
+        const VectorView<E> products = products_.part(0, count);
+        RowProducts<E>(basis, vector_, products);
         for (int32_t i = 0; i < m_; ++i)
-            removed()[i] = T{};
+            removed_[i] = T{};
         for (int32_t k = 0; k < count; ++k) {
-            sums()[from + k] += products()[k];
-            products()[k] = Conj(products()[k]);
+            sums_[from + k] += products[k];
+            products[k] = Conj(products[k]);
         }
-        AddTransposedProduct(conjugate(from), stride_, count, m_, products(), removed());
+        AddTransposedProduct<E>(basis, products, removed_);
         for (int32_t i = 0; i < m_; ++i)
-            vector()[i] = vector()[i] - Conj(removed()[i]);
+            vector_[i] = vector_[i] - Conj(removed_[i]);
     }
     void keep(int32_t j, double length) {
         for (int32_t i = 0; i < m_; ++i)
-            conjugate(j)[i] = Conj(vector()[i]) / length;
+            conjugates_(j, i) = Conj(vector_[i]) / length;
     }
 
     int32_t m_;
     GramSchmidt order_;
-    std::ptrdiff_t stride_;
-    Scratch<E> basis_, vectors_;
+    ScratchParts memory_;
+    MatrixView<E> conjugates_; // the basis in rows, conjugated
+    VectorView<E> vector_, sums_, products_, removed_;
 };
 
+// Rows of r and columns of q.
 template <ElementType E>
-ErrorCode Orthogonalise(const ElementOf<E> *a, int32_t m, int32_t n, GramSchmidt order,
-                        ElementOf<E> *q, ElementOf<E> *r) {
-    if (m < 1 || n < 1)
-        return ErrEmptyInput;
-    if (CheckFinite(a, int64_t{m} * n) != 0)
+bool AreFactors(ConstMatrixView<E> a, QRForm form, ConstMatrixView<E> q, ConstMatrixView<E> r) {
+    const int32_t m = a.rows(), size = form == qrFull ? m : std::min(m, a.cols());
+    return r.rows() == size && r.cols() == a.cols() &&
+           (form == qrOnlyR || (q.rows() == m && q.cols() == size));
+}
+
+// Pivots are empty where the columns stay in their order.
+template <ElementType E>
+ErrorCode Decompose(ConstMatrixView<E> a, QRForm form, IndexVector pivots, MatrixView<E> q,
+                    MatrixView<E> r) {
+    QX_EXPECTS(!a.isEmpty() && AreFactors<E>(a, form, q, r));
+    if (!AllFinite<E>(a))
         return ErrNonFiniteInput;
-    GramSchmidtQR<E> qr(m, order);
-    if (const ErrorCode failed = qr.allocate())
+    HouseholderQR<E> qr(a.rows(), a.cols());
+    if (const ErrorCode failed = qr.take(a))
         return failed;
-    for (int32_t j = 0; j < n; ++j)
-        qr.addColumn(a, n, j, r);
-    for (int32_t j = n; j < m; ++j)
-        qr.addAny(j);
-    qr.writeQ(q);
+    if (pivots.isEmpty())
+        qr.factor();
+    else if (const ErrorCode failed = qr.factorPivoted(pivots))
+        return failed;
+    qr.writeR(r);
+    if (form != qrOnlyR)
+        qr.writeQ(q);
     return 0;
 }
 
 } // namespace
 
-ErrorCode QRDecompose(const DBL *a, int32_t m, int32_t n, int32_t form, DBL *q, DBL *r) {
-    return Decompose<ElementType::DBL>(a, m, n, form, nullptr, q, r);
+template <ElementType E>
+ErrorCode QRDecompose(ConstMatrixView<E> a, QRForm form, MatrixView<E> q, MatrixView<E> r) {
+    return Decompose<E>(a, form, {}, q, r);
 }
-ErrorCode QRDecompose(const CDB *a, int32_t m, int32_t n, int32_t form, CDB *q, CDB *r) {
-    return Decompose<ElementType::CDB>(a, m, n, form, nullptr, q, r);
+
+template <ElementType E>
+ErrorCode QRDecomposePivoted(ConstMatrixView<E> a, QRForm form, IndexVector pivots, MatrixView<E> q,
+                             MatrixView<E> r) {
+    QX_EXPECTS(pivots.size() == a.cols());
+    return Decompose<E>(a, form, pivots, q, r);
 }
-ErrorCode QRDecomposePivoted(const DBL *a, int32_t m, int32_t n, int32_t form, I32 *pivots, DBL *q,
-                             DBL *r) {
-    return Decompose<ElementType::DBL>(a, m, n, form, pivots, q, r);
+
+template <ElementType E>
+ErrorCode QRByGramSchmidt(ConstMatrixView<E> a, GramSchmidt order, MatrixView<E> q,
+                          MatrixView<E> r) {
+    QX_EXPECTS(!a.isEmpty() && AreFactors<E>(a, qrFull, q, r));
+    if (!AllFinite<E>(a))
+        return ErrNonFiniteInput;
+    GramSchmidtQR<E> qr(a.rows(), order);
+    if (const ErrorCode failed = qr.allocate())
+        return failed;
+    for (int32_t j = 0; j < a.cols(); ++j)
+        qr.addColumn(a, j, r);
+    for (int32_t j = a.cols(); j < a.rows(); ++j)
+        qr.addAny(j);
+    qr.writeQ(q);
+    return 0;
 }
-ErrorCode QRDecomposePivoted(const CDB *a, int32_t m, int32_t n, int32_t form, I32 *pivots, CDB *q,
-                             CDB *r) {
-    return Decompose<ElementType::CDB>(a, m, n, form, pivots, q, r);
-}
-ErrorCode QRByGramSchmidt(const DBL *a, int32_t m, int32_t n, GramSchmidt order, DBL *q, DBL *r) {
-    return Orthogonalise<ElementType::DBL>(a, m, n, order, q, r);
-}
-ErrorCode QRByGramSchmidt(const CDB *a, int32_t m, int32_t n, GramSchmidt order, CDB *q, CDB *r) {
-    return Orthogonalise<ElementType::CDB>(a, m, n, order, q, r);
-}
+
+template ErrorCode QRDecompose(ConstRealMatrix, QRForm, RealMatrix, RealMatrix);
+template ErrorCode QRDecompose(ConstComplexMatrix, QRForm, ComplexMatrix, ComplexMatrix);
+template ErrorCode QRDecomposePivoted(ConstRealMatrix, QRForm, IndexVector, RealMatrix, RealMatrix);
+template ErrorCode QRDecomposePivoted(ConstComplexMatrix, QRForm, IndexVector, ComplexMatrix,
+                                      ComplexMatrix);
+template ErrorCode QRByGramSchmidt(ConstRealMatrix, GramSchmidt, RealMatrix, RealMatrix);
+template ErrorCode QRByGramSchmidt(ConstComplexMatrix, GramSchmidt, ComplexMatrix, ComplexMatrix);
 
 } // namespace qx

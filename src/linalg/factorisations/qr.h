@@ -1,36 +1,37 @@
 #ifndef QX_LINALG_FACTORISATIONS_QR_H
 #define QX_LINALG_FACTORISATIONS_QR_H
 
-#include "qx/types.h"
+#include "linalg/matrix.h"
 
 namespace qx {
 
-// What QR routines form of a row-major m by n matrix, k = min(m, n): all of q (m by m) and r (m by
+// What QR routines form of an m by n matrix, k = min(m, n): all of q (m by m) and r (m by
 // n), the economical q (m by k) and r (k by n), or r (k by n) alone.
 enum QRForm : int32_t { qrFull = 0, qrEconomical = 1, qrOnlyR = 2 };
 
 // a = q r by Householder reflections; q is unitary and r upper triangular with a real diagonal of
-// either sign. a stays as it is. q is not touched by qrOnlyR.
-// ErrEmptyInput, ErrInvalidSelector, ErrNonFiniteInput, ErrOutOfMemory.
-ErrorCode QRDecompose(const DBL *a, int32_t m, int32_t n, int32_t form, DBL *q, DBL *r);
-ErrorCode QRDecompose(const CDB *a, int32_t m, int32_t n, int32_t form, CDB *q, CDB *r);
+// either sign. a stays as it is. q may be empty with qrOnlyR.
+// ErrNonFiniteInput, ErrOutOfMemory.
+template <ElementType E>
+ErrorCode QRDecompose(ConstMatrixView<E> a, QRForm form, MatrixView<E> q, MatrixView<E> r);
 
 // The same for the matrix whose column j is column pivots[j] of a. Each step takes the column that
 // is longest below the rows done (P. Businger and G. H. Golub, "Linear least squares solutions by
 // Householder transformations", 1965), so the diagonal of r falls in absolute value.
-ErrorCode QRDecomposePivoted(const DBL *a, int32_t m, int32_t n, int32_t form, I32 *pivots, DBL *q,
-                             DBL *r);
-ErrorCode QRDecomposePivoted(const CDB *a, int32_t m, int32_t n, int32_t form, I32 *pivots, CDB *q,
-                             CDB *r);
+template <ElementType E>
+ErrorCode QRDecomposePivoted(ConstMatrixView<E> a, QRForm form, IndexVector pivots, MatrixView<E> q,
+                             MatrixView<E> r);
 
 // Full q and r by Gram-Schmidt orthogonalisation, each projection made twice: q is then unitary to
 // a small multiple of m eps also where the columns nearly depend on each other (L. Giraud, J.
 // Langou, M. Rozloznik, "On the loss of orthogonality in the Gram-Schmidt orthogonalization
 // process", 2005). The diagonal of r is not negative; it is 0 for a column that depends on those
 // before it within m eps, where q goes on with a vector orthogonal to them.
+// ErrNonFiniteInput, ErrOutOfMemory.
 enum class GramSchmidt { Modified, Classical };
-ErrorCode QRByGramSchmidt(const DBL *a, int32_t m, int32_t n, GramSchmidt order, DBL *q, DBL *r);
-ErrorCode QRByGramSchmidt(const CDB *a, int32_t m, int32_t n, GramSchmidt order, CDB *q, CDB *r);
+template <ElementType E>
+ErrorCode QRByGramSchmidt(ConstMatrixView<E> a, GramSchmidt order, MatrixView<E> q,
+                          MatrixView<E> r);
 
 } // namespace qx
 

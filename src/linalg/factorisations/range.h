@@ -1,6 +1,7 @@
 #ifndef QX_LINALG_FACTORISATIONS_RANGE_H
 #define QX_LINALG_FACTORISATIONS_RANGE_H
 
+#include "frame/views.h"
 #include "linalg/scalar.h"
 
 #include <algorithm>
@@ -12,12 +13,11 @@ namespace qx {
 // overflow nor vanish, and returns the exponent that takes its values back. No digit changes.
 // Matrices of ordinary size are left alone; which are too small, the caller says.
 template <ElementType E>
-int BringIntoRange(ElementOf<E> *a, std::ptrdiff_t stride, int32_t rows, int32_t cols,
-                   double tooSmall) {
+int BringIntoRange(MatrixView<E> a, double tooSmall) {
     double largest = 0.0;
-    for (int32_t i = 0; i < rows; ++i)
-        for (int32_t j = 0; j < cols; ++j)
-            largest = std::max(largest, AbsSum(a[i * stride + j] * 0.5));
+    for (int32_t i = 0; i < a.rows(); ++i)
+        for (int32_t j = 0; j < a.cols(); ++j)
+            largest = std::max(largest, AbsSum(a(i, j) * 0.5));
     if (largest == 0.0 || (largest >= tooSmall && largest <= 0x1p400))
         return 0;
     int exponent;
@@ -27,9 +27,9 @@ int BringIntoRange(ElementOf<E> *a, std::ptrdiff_t stride, int32_t rows, int32_t
     // In two steps, since one factor could overflow.
     const double factor = std::ldexp(1.0, -exponent / 2);
     const double rest = std::ldexp(1.0, -exponent - (-exponent / 2));
-    for (int32_t i = 0; i < rows; ++i)
-        for (int32_t j = 0; j < cols; ++j)
-            a[i * stride + j] = a[i * stride + j] * factor * rest;
+    for (int32_t i = 0; i < a.rows(); ++i)
+        for (int32_t j = 0; j < a.cols(); ++j)
+            a(i, j) = a(i, j) * factor * rest;
     return exponent;
 }
 

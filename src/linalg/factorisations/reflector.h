@@ -48,38 +48,38 @@ public:
     Value kappa = ScalarOf<E>::Of(0.0);
 };
 
-// a becomes H a: a - v (v^H a) / kappa. v is contiguous; `work` holds rows + cols elements.
+// a becomes H a: a - v (v^H a) / kappa. `work` has rows + cols elements at least.
 template <ElementType E>
-void ReflectFromLeft(ElementOf<E> *a, std::ptrdiff_t stride, int32_t rows, int32_t cols,
-                     const ElementOf<E> *v, typename ScalarOf<E>::type kappa, ElementOf<E> *work) {
-    typedef ElementOf<E> T;
+void ReflectFromLeft(MatrixView<E> a, ConstVectorView<E> v, typename ScalarOf<E>::type kappa,
+                     VectorView<E> work) {
+    const int32_t rows = a.rows(), cols = a.cols();
     if (AbsSum(kappa) == 0.0 || cols < 1)
         return;
-    T *const conjugate = work, *const product = work + rows;
+    const VectorView<E> conjugate = work.part(0, rows), product = work.part(rows, cols);
     for (int32_t i = 0; i < rows; ++i)
         conjugate[i] = Conj(v[i]);
-    for (int32_t j = 0; j < cols; ++j)
-        product[j] = T{};
-    AddTransposedProduct(a, stride, rows, cols, conjugate, product);
-    for (int32_t j = 0; j < cols; ++j)
-        product[j] = -(product[j] / kappa);
-    AddOuterProduct(a, stride, rows, cols, v, product);
+    for (ElementOf<E> &element : product)
+        element = {};
+    AddTransposedProduct<E>(a, conjugate, product);
+    for (ElementOf<E> &element : product)
+        element = -(element / kappa);
+    AddOuterProduct<E>(a, v, product);
 }
 
-// a becomes a H: a - (a v) v^H / kappa. `work` holds rows + cols elements.
+// a becomes a H: a - (a v) v^H / kappa. `work` has rows + cols elements at least.
 template <ElementType E>
-void ReflectFromRight(ElementOf<E> *a, std::ptrdiff_t stride, int32_t rows, int32_t cols,
-                      const ElementOf<E> *v, typename ScalarOf<E>::type kappa, ElementOf<E> *work) {
-    typedef ElementOf<E> T;
+void ReflectFromRight(MatrixView<E> a, ConstVectorView<E> v, typename ScalarOf<E>::type kappa,
+                      VectorView<E> work) {
+    const int32_t rows = a.rows(), cols = a.cols();
     if (AbsSum(kappa) == 0.0 || rows < 1)
         return;
-    T *const conjugate = work, *const product = work + cols;
+    const VectorView<E> conjugate = work.part(0, cols), product = work.part(cols, rows);
     for (int32_t j = 0; j < cols; ++j)
         conjugate[j] = Conj(v[j]);
-    RowProducts(a, stride, rows, cols, v, product);
-    for (int32_t i = 0; i < rows; ++i)
-        product[i] = -(product[i] / kappa);
-    AddOuterProduct(a, stride, rows, cols, product, conjugate);
+    RowProducts<E>(a, v, product);
+    for (ElementOf<E> &element : product)
+        element = -(element / kappa);
+    AddOuterProduct<E>(a, product, conjugate);
 }
 
 } // namespace qx

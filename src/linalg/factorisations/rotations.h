@@ -11,14 +11,13 @@ namespace qx {
 class RotationQueue {
 public:
     RotationQueue() = default;
-    RotationQueue(DBL *a, std::ptrdiff_t stride, int32_t width)
-        : a_(a), stride_(stride), width_(width) {}
+    explicit RotationQueue(RealMatrix a) : a_(a) {}
     RotationQueue(const RotationQueue &) = delete;
     RotationQueue &operator=(const RotationQueue &) = delete;
     ~RotationQueue() { flush(); }
 
     void add(int32_t p, int32_t q, double c, double s) {
-        if (a_ == nullptr)
+        if (a_.isEmpty())
             return;
         rotations_[count_++] = {p, q, c, s};
         if (count_ == capacity)
@@ -26,15 +25,13 @@ public:
     }
     void flush() {
         if (count_ > 0)
-            RotateRows(a_, stride_, width_, rotations_, count_);
+            RotateRows(a_.data(), a_.stride(), a_.cols(), rotations_, count_);
         count_ = 0;
     }
 
 private:
     static constexpr int32_t capacity = 512;
-    DBL *a_ = nullptr;
-    std::ptrdiff_t stride_ = 0;
-    int32_t width_ = 0;
+    RealMatrix a_;
     int32_t count_ = 0;
     Rotation rotations_[capacity];
 };

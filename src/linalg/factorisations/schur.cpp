@@ -1,11 +1,8 @@
 #include "linalg/factorisations/schur.h"
 
-#include "frame/scratch.h"
 #include "linalg/aligned.h"
 #include "linalg/factorisations/block_order.h"
 #include "linalg/lapack.h"
-#include "linalg/matrix.h"
-#include "linalg/transpose.h"
 
 #include <cmath>
 
@@ -19,15 +16,15 @@ class OrderedSchur {
 public:
     explicit OrderedSchur(int32_t n) : n_(n) {}
 
-    ErrorCode compute(const T *a, int32_t order, bool withVectors, CDB *w) {
-        const int64_t square = int64_t{n_} * n_;
-        if (const ErrorCode failed = form_.allocate(square))
+    ErrorCode compute(ConstMatrixView<E> a, SchurOrder order, bool withVectors, ComplexVector w) {
+        const int32_t vectorsOrder = withVectors ? n_ : 0;
+        if (const ErrorCode failed =
+                memory_.take(Aligned(Sized(form_, n_, n_)),
+                             Aligned(Sized(vectors_, vectorsOrder, vectorsOrder))))
             return failed;
-        if (const ErrorCode failed = vectors_.allocate(withVectors ? square : 0))
-            return failed;
-        withVectors_ = withVectors;
-        CopyTransposed<E>(a, n_, n_, n_, form_.data(), n_);
-        const int32_t info = lapack::Schur(n_, form_.data(), w, vectors());
+        T *const vectors = withVectors ? vectors_.data() : nullptr;
+        CopyTransposed<E>(a, form_);
+        const int32_t info = lapack::Schur(n_, form_.data(), w.data(), vectors);
         if (const ErrorCode failed = CodeOfSchur(info, n_))
             return failed;
         if (order == schurUnordered)
@@ -35,27 +32,26 @@ public:
         if (const ErrorCode failed = blocks_.allocate(n_))
             return failed;
         classify(order, w);
-        const auto move = [this](int32_t from, int32_t to) {
-            return lapack::MoveInSchur(n_, form_.data(), vectors(), from, to);
+        const auto move = [=, this](int32_t from, int32_t to) {
+            return lapack::MoveInSchur(n_, form_.data(), vectors, from, to);
         };
         if (const ErrorCode failed = blocks_.sort(move))
             return failed;
         readValues(w);
         return 0;
     }
-    void write(T *t, T *z) const {
-        CopyTransposed<E>(form_.data(), n_, n_, n_, t, n_);
-        if (z != nullptr)
-            CopyTransposed<E>(vectors_.data(), n_, n_, n_, z, n_);
+    void write(MatrixView<E> t, MatrixView<E> z) const {
+        CopyTransposed<E>(form_, t);
+        if (!z.isEmpty())
+            CopyTransposed<E>(vectors_, z);
     }
 
 private:
-    T *vectors() const { return withVectors_ ? vectors_.data() : nullptr; }
     // Column after column, as LAPACK has it.
-    T &at(int32_t i, int32_t j) const { return form_[std::ptrdiff_t{j} * n_ + i]; }
+    T &at(int32_t i, int32_t j) const { return form_(j, i); }
 
     // The blocks along the diagonal, each with the key by which they ascend.
-    void classify(int32_t order, CDB *w) {
+    void classify(SchurOrder order, ComplexVector w) {
         const double tiny = epsilon * sumOf(w);
         for (int32_t i = 0; i < n_;) {
             const bool isPair = E == ElementType::DBL && w[i].im != 0.0 && i + 1 < n_;
@@ -70,14 +66,14 @@ private:
             i += size;
         }
     }
-    double sumOf(const CDB *w) const {
+    double sumOf(ConstComplexVector w) const {
         double sum = 0.0;
         for (int32_t i = 0; i < n_; ++i)
             sum += AbsSum(w[i]);
         return sum;
     }
 
-    void readValues(CDB *w) const {
+    void readValues(ComplexVector w) const {
         for (int32_t i = 0; i < n_; ++i) {
             w[i] = {RealPart(at(i, i)), ImagPart(at(i, i))};
             if (E == ElementType::CDB || i + 1 == n_ || RealPart(at(i + 1, i)) == 0.0)
@@ -91,34 +87,29 @@ private:
     }
 
     int32_t n_;
-    bool withVectors_ = false;
-    AlignedScratch<E> form_, vectors_;
+    ScratchParts memory_;
+    MatrixView<E> form_, vectors_;
     BlockOrder blocks_;
 };
 
+} // namespace
+
 template <ElementType E>
-ErrorCode Decompose(const ElementOf<E> *a, int32_t n, int32_t order, ElementOf<E> *z,
-                    ElementOf<E> *t, CDB *w) {
-    if (order < schurUnordered || order > schurModulusDescending)
-        return ErrInvalidSelector;
-    if (n < 1)
-        return ErrEmptyInput;
-    if (CheckFinite(a, int64_t{n} * n) != 0)
+ErrorCode SchurDecompose(ConstMatrixView<E> a, SchurOrder order, MatrixView<E> z, MatrixView<E> t,
+                         ComplexVector w) {
+    QX_EXPECTS(a.isSquare() && !a.isEmpty() && w.size() == a.rows());
+    if (!AllFinite<E>(a))
         return ErrNonFiniteInput;
-    OrderedSchur<E> schur(n);
-    if (const ErrorCode failed = schur.compute(a, order, z != nullptr, w))
+    OrderedSchur<E> schur(a.rows());
+    if (const ErrorCode failed = schur.compute(a, order, !z.isEmpty(), w))
         return failed;
     schur.write(t, z);
     return 0;
 }
 
-} // namespace
-
-ErrorCode SchurDecompose(const DBL *a, int32_t n, int32_t order, DBL *z, DBL *t, CDB *w) {
-    return Decompose<ElementType::DBL>(a, n, order, z, t, w);
-}
-ErrorCode SchurDecompose(const CDB *a, int32_t n, int32_t order, CDB *z, CDB *t, CDB *w) {
-    return Decompose<ElementType::CDB>(a, n, order, z, t, w);
-}
+template ErrorCode SchurDecompose(ConstRealMatrix, SchurOrder, RealMatrix, RealMatrix,
+                                  ComplexVector);
+template ErrorCode SchurDecompose(ConstComplexMatrix, SchurOrder, ComplexMatrix, ComplexMatrix,
+                                  ComplexVector);
 
 } // namespace qx

@@ -1,7 +1,7 @@
 #ifndef QX_LINALG_FACTORISATIONS_SCHUR_H
 #define QX_LINALG_FACTORISATIONS_SCHUR_H
 
-#include "qx/types.h"
+#include "linalg/matrix.h"
 
 namespace qx {
 
@@ -14,14 +14,14 @@ enum SchurOrder : int32_t {
     schurModulusDescending = 4
 };
 
-// Schur form a = z t z^H of the square row-major matrix of order n through LAPACK: z is unitary, t
-// upper triangular, for real elements with blocks of two for conjugate pairs, and w its
-// eigenvalues. z may be null. a may be t.
+// Schur form a = z t z^H of a square matrix through LAPACK: z is unitary, t upper triangular, for
+// real elements with blocks of two for conjugate pairs, and w its eigenvalues. z may be empty. a
+// may be t.
 //
-// ErrEmptyInput, ErrInvalidSelector, ErrNonFiniteInput, ErrOutOfMemory, ErrIterationLimit,
-// ErrConditionTooHigh.
-ErrorCode SchurDecompose(const DBL *a, int32_t n, int32_t order, DBL *z, DBL *t, CDB *w);
-ErrorCode SchurDecompose(const CDB *a, int32_t n, int32_t order, CDB *z, CDB *t, CDB *w);
+// ErrNonFiniteInput, ErrOutOfMemory, ErrIterationLimit, ErrConditionTooHigh.
+template <ElementType E>
+ErrorCode SchurDecompose(ConstMatrixView<E> a, SchurOrder order, MatrixView<E> z, MatrixView<E> t,
+                         ComplexVector w);
 
 } // namespace qx
 

@@ -1,4 +1,3 @@
-#include "frame/scratch.h"
 #include "linalg/complex_functions.h"
 #include "linalg/functions/diagonal.h"
 #include "linalg/functions/functions.h"
@@ -7,6 +6,7 @@
 #include "linalg/systems/lu.h"
 
 #include <cmath>
+#include <utility>
 
 namespace qx {
 namespace {
@@ -18,116 +18,89 @@ int32_t Squarings(double norm) {
 
 template <ElementType E>
 class PadeExponential {
-    typedef ElementOf<E> T;
-
 public:
-    explicit PadeExponential(int32_t n) : n_(n), count_(std::ptrdiff_t{n} * n) {}
-
-    ErrorCode replace(T *a) {
-        if (const ErrorCode failed = blocks_.allocate(4 * int64_t{count_}))
-            return failed;
-        if (const ErrorCode failed = pivots_.allocate(n_))
+    ErrorCode replace(MatrixView<E> a) {
+        const int32_t n = a.rows();
+        if (const ErrorCode failed =
+                memory_.take(Sized(scaled_, n, n), Sized(denominator_, n, n), Sized(power_, n, n),
+                             Sized(product_, n, n), Sized(pivots_, n)))
             return failed;
         double norm;
-        if (const ErrorCode failed = MatrixNorm(a, n_, n_, infinityNorm, &norm))
+        if (const ErrorCode failed = MatrixNorm<E>(a, infinityNorm, &norm))
             return failed;
         if (!std::isfinite(norm))
             return ErrNonFiniteInput;
         const int32_t squarings = Squarings(norm);
         // Directly, for 2^squarings itself may overflow.
         const double factor = std::ldexp(1.0, -squarings);
-        for (std::ptrdiff_t i = 0; i < count_; ++i)
-            scaled()[i] = a[i] * factor;
+        for (int32_t i = 0; i < n; ++i)
+            for (int32_t j = 0; j < n; ++j)
+                scaled_(i, j) = a(i, j) * factor;
         if (const ErrorCode failed = sumUp(PadeDegree(1e-8, norm), a))
             return failed;
         if (const ErrorCode failed = divide(a))
             return failed;
         if (const ErrorCode failed = square(squarings))
             return failed;
-        for (std::ptrdiff_t i = 0; i < count_; ++i)
-            a[i] = scaled()[i];
+        CopyMatrix<E>(scaled_, a);
         return 0;
     }
 
 private:
-    T *scaled() const { return blocks_.data(); }
-    T *denominator() const { return blocks_.data() + count_; }
-    T *power() const { return blocks_.data() + 2 * count_; }
-    T *product() const { return blocks_.data() + 3 * count_; }
-
-    ErrorCode multiply(const T *a, const T *b, T *c) const {
-        return MatrixProductPlain(a, b, n_, n_, n_, c);
-    }
-
     // The numerator and the denominator of the approximant of degree q at the scaled matrix.
-    ErrorCode sumUp(int32_t q, T *numerator) {
-        for (std::ptrdiff_t i = 0; i < count_; ++i) {
-            numerator[i] = scaled()[i] * 0.5;
-            denominator()[i] = scaled()[i] * -0.5;
+    ErrorCode sumUp(int32_t q, MatrixView<E> numerator) {
+        const int32_t n = numerator.rows();
+        for (int32_t i = 0; i < n; ++i)
+            for (int32_t j = 0; j < n; ++j) {
+                numerator(i, j) = scaled_(i, j) * 0.5;
+                denominator_(i, j) = scaled_(i, j) * -0.5;
+            }
+        for (int32_t i = 0; i < n; ++i) {
+            numerator(i, i) = numerator(i, i) + ScalarOf<E>::Of(1.0);
+            denominator_(i, i) = denominator_(i, i) + ScalarOf<E>::Of(1.0);
         }
-        for (std::ptrdiff_t i = 0; i < n_; ++i) {
-            const std::ptrdiff_t at = i * n_ + i;
-            numerator[at] = numerator[at] + ScalarOf<E>::Of(1.0);
-            denominator()[at] = denominator()[at] + ScalarOf<E>::Of(1.0);
-        }
-        if (const ErrorCode failed = multiply(scaled(), scaled(), power()))
+        if (const ErrorCode failed = MatrixProduct<E>(scaled_, scaled_, power_))
             return failed;
         double c = 0.5, sign = 1.0;
         for (int32_t k = 2; k <= q; ++k) {
             c = ((q - k) + 1.0) / (k * (1.0 + (2.0 * q - k))) * c;
-            for (std::ptrdiff_t i = 0; i < count_; ++i) {
-                numerator[i] = numerator[i] + power()[i] * c;
-                denominator()[i] = denominator()[i] + power()[i] * (sign * c);
-            }
+            for (int32_t i = 0; i < n; ++i)
+                for (int32_t j = 0; j < n; ++j) {
+                    numerator(i, j) = numerator(i, j) + power_(i, j) * c;
+                    denominator_(i, j) = denominator_(i, j) + power_(i, j) * (sign * c);
+                }
             sign = -sign;
             if (k == q)
                 break;
-            if (const ErrorCode failed = multiply(power(), scaled(), product()))
+            if (const ErrorCode failed = MatrixProduct<E>(power_, scaled_, product_))
                 return failed;
-            for (std::ptrdiff_t i = 0; i < count_; ++i)
-                power()[i] = product()[i];
+            std::swap(power_, product_);
         }
         return 0;
     }
 
     // The scaled matrix becomes the quotient. A singular denominator is not looked for.
-    ErrorCode divide(const T *numerator) {
+    ErrorCode divide(ConstMatrixView<E> numerator) {
         int32_t parity;
-        const ErrorCode status = LUDecompose(denominator(), n_, n_, pivots_.data(), &parity);
-        if (status < 0)
-            return status;
-        if (const ErrorCode failed = InvertFactors(denominator(), pivots_.data(), n_))
+        LUDecompose<E>(denominator_, pivots_, &parity);
+        if (const ErrorCode failed = InvertFactors<E>(denominator_, pivots_))
             return failed;
-        return multiply(denominator(), numerator, scaled());
+        return MatrixProduct<E>(denominator_, numerator, scaled_);
     }
 
     ErrorCode square(int32_t times) {
         for (; times > 0; --times) {
-            if (const ErrorCode failed = multiply(scaled(), scaled(), product()))
+            if (const ErrorCode failed = MatrixProduct<E>(scaled_, scaled_, product_))
                 return failed;
-            for (std::ptrdiff_t i = 0; i < count_; ++i)
-                scaled()[i] = product()[i];
+            std::swap(scaled_, product_);
         }
         return 0;
     }
 
-    int32_t n_;
-    std::ptrdiff_t count_;
-    Scratch<E> blocks_;
-    Scratch<ElementType::I32> pivots_;
+    ScratchParts memory_;
+    MatrixView<E> scaled_, denominator_, power_, product_;
+    IndexVector pivots_;
 };
-
-template <ElementType E>
-ErrorCode ReplaceByExponential(ElementOf<E> *a, int32_t n) {
-    if (n < 1)
-        return ErrEmptyInput;
-    if (IsDiagonal<E>(a, n)) {
-        for (std::ptrdiff_t i = 0; i < n; ++i)
-            a[i * n + i] = Exponential(a[i * n + i]);
-        return 0;
-    }
-    return PadeExponential<E>(n).replace(a);
-}
 
 } // namespace
 
@@ -144,11 +117,17 @@ int32_t PadeDegree(double tolerance, double norm) {
     return q;
 }
 
-ErrorCode MatrixExponential(DBL *a, int32_t n) {
-    return ReplaceByExponential<ElementType::DBL>(a, n);
+template <ElementType E>
+ErrorCode MatrixExponential(MatrixView<E> a) {
+    QX_EXPECTS(a.isSquare() && !a.isEmpty());
+    if (!IsDiagonal<E>(a))
+        return PadeExponential<E>().replace(a);
+    for (int32_t i = 0; i < a.rows(); ++i)
+        a(i, i) = Exponential(a(i, i));
+    return 0;
 }
-ErrorCode MatrixExponential(CDB *a, int32_t n) {
-    return ReplaceByExponential<ElementType::CDB>(a, n);
-}
+
+template ErrorCode MatrixExponential(RealMatrix);
+template ErrorCode MatrixExponential(ComplexMatrix);
 
 } // namespace qx

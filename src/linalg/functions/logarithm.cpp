@@ -1,71 +1,147 @@
-#include "frame/scratch.h"
 #include "linalg/complex_functions.h"
 #include "linalg/eigenproblems/general.h"
 #include "linalg/functions/diagonal.h"
 #include "linalg/functions/functions.h"
-#include "linalg/matrix.h"
 #include "linalg/products/products.h"
 #include "linalg/properties/scalars.h"
 #include "linalg/systems/lu.h"
 
 #include <algorithm>
 #include <cmath>
-#include <limits>
 
 namespace qx {
 namespace {
 
-typedef Scratch<ElementType::CDB> Block;
+constexpr auto E = ElementType::CDB;
 
 constexpr double reached = 1e-12;
 
-void Copy(const CDB *from, int64_t count, CDB *to) {
-    for (int64_t i = 0; i < count; ++i)
-        to[i] = from[i];
-}
-
-// log of every element; ErrDegenerateValue for 0.
-ErrorCode TakeLogarithms(CDB *z, std::ptrdiff_t stride, int32_t count) {
-    for (int32_t i = 0; i < count; ++i) {
-        CDB &value = z[i * stride];
-        if (value.re * value.re + value.im * value.im == 0.0)
-            return ErrDegenerateValue;
-        value = Logarithm(value);
-    }
+// log of z in its place; ErrDegenerateValue for 0.
+ErrorCode TakeLogarithm(CDB *z) {
+    if (SquaredModulus(*z) == 0.0)
+        return ErrDegenerateValue;
+    *z = Logarithm(*z);
     return 0;
 }
 
-// a less the identity.
-void SubtractIdentity(const CDB *a, int32_t n, CDB *difference) {
-    Copy(a, int64_t{n} * n, difference);
-    for (std::ptrdiff_t i = 0; i < n; ++i)
-        difference[i * n + i].re -= 1.0;
+// The largest modulus of a - b, relative to the largest of a plus the largest of b; infinity where
+// one of them is not finite.
+double RelativeError(ConstComplexMatrix a, ConstComplexMatrix b) {
+    if (!AllFinite<E>(a) || !AllFinite<E>(b))
+        return HUGE_VAL;
+    double difference = 0.0, first = 0.0, second = 0.0;
+    for (int32_t i = 0; i < a.rows(); ++i)
+        for (int32_t j = 0; j < a.cols(); ++j) {
+            difference = std::max(difference, std::sqrt(SquaredModulus(a(i, j) - b(i, j))));
+            first = std::max(first, std::sqrt(SquaredModulus(a(i, j))));
+            second = std::max(second, std::sqrt(SquaredModulus(b(i, j))));
+        }
+    return difference / (first + second);
+}
+
+// Through eigenvectors: v log(w) v^-1. ErrConditionTooHigh, ErrDegenerateValue (an eigenvalue is
+// 0), ErrSingularMatrix, and the codes of the eigenproblem.
+ErrorCode LogByEigen(ConstComplexMatrix a, ComplexMatrix log) {
+    const int32_t n = a.rows();
+    ComplexMatrix vectors, inverse;
+    ComplexVector values;
+    ScratchParts memory;
+    if (const ErrorCode failed =
+            memory.take(Sized(vectors, n, n), Sized(inverse, n, n), Sized(values, n)))
+        return failed;
+    if (const ErrorCode failed = EigenGeneral<E>(a, values, vectors))
+        return failed;
+    double condition;
+    const ErrorCode status = ConditionNumber<E>(vectors, twoNorm, &condition);
+    if (status == ErrOutOfMemory)
+        return status;
+    if (status != 0 || !(condition <= 1e14))
+        return ErrConditionTooHigh;
+    for (CDB &value : values)
+        if (const ErrorCode failed = TakeLogarithm(&value))
+            return failed;
+    if (const ErrorCode failed = InvertByLU<E>(vectors, inverse))
+        return failed;
+    for (int32_t i = 0; i < n; ++i)
+        for (int32_t j = 0; j < n; ++j)
+            vectors(i, j) = vectors(i, j) * values[j];
+    return MatrixProduct<E>(vectors, inverse, log);
+}
+
+// 2^k times the logarithm of the k-th root of a, after as many roots as bring the norm of y = 1 -
+// root to 0.1: -(y + y^2 / 2 + ...) with ten terms. ErrIterationLimit after 100 roots, and the
+// codes of the roots.
+ErrorCode LogByRoots(ConstComplexMatrix a, ComplexMatrix log) {
+    constexpr int32_t mostRoots = 100, terms = 10;
+    constexpr double radius = 0.1;
+    const int32_t n = a.rows();
+    ComplexMatrix root, y, power, product;
+    ScratchParts memory;
+    if (const ErrorCode failed = memory.take(Sized(root, n, n), Sized(y, n, n), Sized(power, n, n),
+                                             Sized(product, n, n)))
+        return failed;
+    CopyMatrix<E>(a, root);
+    ErrorCode status = 0;
+    int32_t roots = 0;
+    for (;; ++roots) {
+        double norm;
+        CopyMatrix<E>(root, y);
+        for (int32_t i = 0; i < n; ++i)
+            y(i, i).re -= 1.0;
+        if (const ErrorCode failed = MatrixNorm<E>(y, frobeniusNorm, &norm))
+            return failed;
+        if (!(norm > radius))
+            break;
+        if (roots == mostRoots)
+            return ErrIterationLimit;
+        status = MatrixSquareRoot(root, root);
+        if (status < 0)
+            return status;
+    }
+    for (int32_t i = 0; i < n; ++i)
+        for (int32_t j = 0; j < n; ++j)
+            log(i, j) = power(i, j) = y(i, j) = -y(i, j);
+    for (int32_t k = 1; k < terms; ++k) {
+        if (const ErrorCode failed = MatrixProduct<E>(power, y, product))
+            return failed;
+        std::swap(power, product);
+        const double factor = 1.0 / (k + 1);
+        for (int32_t i = 0; i < n; ++i)
+            for (int32_t j = 0; j < n; ++j)
+                log(i, j) += power(i, j) * factor;
+    }
+    const double scale = -1.0 * std::ldexp(1.0, roots);
+    for (CDB &element : log.elements())
+        element = element * scale;
+    return status;
 }
 
 // Refines the logarithm of one matrix.
 class Refinement {
 public:
-    Refinement(const CDB *a, int32_t n) : a_(a), n_(n), count_(int64_t{n} * n) {}
+    explicit Refinement(ConstComplexMatrix a) : a_(a) {}
 
-    ErrorCode allocate() { return blocks_.allocate(5 * count_); }
-    CDB *log() const { return blocks_.data(); }
+    ErrorCode allocate() {
+        const int32_t n = a_.rows();
+        return memory_.take(Sized(log_, n, n), Sized(exponential_, n, n), Sized(inverse_, n, n),
+                            Sized(correction_, n, n), Sized(best_, n, n));
+    }
+    ComplexMatrix log() const { return log_; }
 
-    // Whether exp of the logarithm gives a back. Else *status tells a failure.
+    // Whether exp of the logarithm gives a back. Else *status says whether something failed.
     bool isExact(ErrorCode *status) {
-        Copy(log(), count_, exponential());
-        *status = MatrixExponential(exponential(), n_);
+        CopyMatrix<E>(log_, exponential_);
+        *status = MatrixExponential<E>(exponential_);
         if (*status < 0)
             return false;
-        if (MatrixRelativeError(a_, exponential(), n_, &error_) != 0)
-            error_ = HUGE_VAL;
+        error_ = RelativeError(a_, exponential_);
         return error_ < reached;
     }
 
     ErrorCode improve() {
-        Copy(log(), count_, best());
-        bestError_ = error_;
-        perturb(exponential());
-        ErrorCode status = LogByEigen(exponential(), n_, log());
+        keepBest();
+        perturb(exponential_);
+        ErrorCode status = LogByEigen(exponential_, log_);
         if (status < 0)
             return status;
         if (isExact(&status) || status < 0)
@@ -87,179 +163,97 @@ public:
     }
 
 private:
-    CDB *exponential() const { return blocks_.data() + count_; }
-    CDB *inverse() const { return blocks_.data() + 2 * count_; }
-    CDB *correction() const { return blocks_.data() + 3 * count_; }
-    CDB *best() const { return blocks_.data() + 4 * count_; }
-
     void keepBest() {
-        Copy(log(), count_, best());
+        CopyMatrix<E>(log_, best_);
         bestError_ = error_;
     }
     ErrorCode giveBest() {
-        Copy(best(), count_, log());
-        return CheckFinite(log(), count_) != 0 ? ErrNonFiniteInput : WarnLowAccuracy;
+        CopyMatrix<E>(best_, log_);
+        return AllFinite<E>(log_) ? WarnLowAccuracy : ErrNonFiniteInput;
     }
 
     // The matrix with 1e-12 / n of a fixed sequence, the logistic map, on all its elements.
-    void perturb(CDB *perturbed) const {
+    void perturb(ComplexMatrix perturbed) const {
+        const int32_t n = a_.rows();
         double x = 0.142857;
-        for (int64_t i = 0; i < count_; ++i) {
-            x = (1.0 - x) * (x * 4.0);
-            perturbed[i].re = x * 1e-12 / n_ + a_[i].re;
-            x = (1.0 - x) * (x * 4.0);
-            perturbed[i].im = x * 1e-12 / n_ + a_[i].im;
-        }
+        for (int32_t i = 0; i < n; ++i)
+            for (int32_t j = 0; j < n; ++j) {
+                x = (1.0 - x) * (x * 4.0);
+                perturbed(i, j).re = x * 1e-12 / n + a_(i, j).re;
+                x = (1.0 - x) * (x * 4.0);
+                perturbed(i, j).im = x * 1e-12 / n + a_(i, j).im;
+            }
     }
 
     // One Newton step: log - (exp(log) - a) exp(log)^-1.
     ErrorCode correct(bool *converged) {
-        ErrorCode status = InvertByLU(exponential(), n_, inverse());
-        if (status < 0)
-            return status;
-        for (int64_t i = 0; i < count_; ++i)
-            exponential()[i] -= a_[i];
-        status = MatrixProductPlain(exponential(), inverse(), n_, n_, n_, correction());
-        if (status < 0)
-            return status;
-        if (CheckFinite(correction(), count_) != 0)
+        const int32_t n = a_.rows();
+        if (const ErrorCode failed = InvertByLU<E>(exponential_, inverse_))
+            return failed;
+        for (int32_t i = 0; i < n; ++i)
+            for (int32_t j = 0; j < n; ++j)
+                exponential_(i, j) -= a_(i, j);
+        if (const ErrorCode failed = MatrixProduct<E>(exponential_, inverse_, correction_))
+            return failed;
+        if (!AllFinite<E>(correction_))
             return giveBest();
         *converged = true;
-        for (int64_t i = 0; i < count_; ++i) {
-            log()[i] -= correction()[i];
-            const CDB value = log()[i], change = correction()[i];
-            if (std::fabs(change.re) > std::fabs(value.re) * reached ||
-                std::fabs(change.im) > std::fabs(value.im) * reached)
-                *converged = false;
-        }
+        for (int32_t i = 0; i < n; ++i)
+            for (int32_t j = 0; j < n; ++j) {
+                log_(i, j) -= correction_(i, j);
+                const CDB value = log_(i, j), change = correction_(i, j);
+                if (std::fabs(change.re) > std::fabs(value.re) * reached ||
+                    std::fabs(change.im) > std::fabs(value.im) * reached)
+                    *converged = false;
+            }
         return 0;
     }
 
-    const CDB *a_;
-    int32_t n_;
-    int64_t count_;
+    ConstComplexMatrix a_;
+    ScratchParts memory_;
+    ComplexMatrix log_, exponential_, inverse_, correction_, best_;
     double error_ = 0.0, bestError_ = 0.0;
-    Block blocks_;
 };
 
 // What repeated roots give where the eigenvalues gave `failure`; the result replaces a.
-ErrorCode FallBackOnRoots(CDB *a, int32_t n, CDB *log, ErrorCode failure) {
-    const ErrorCode status = LogByRoots(a, n, log, 10, 0.1);
+ErrorCode FallBackOnRoots(ComplexMatrix a, ComplexMatrix log, ErrorCode failure) {
+    const ErrorCode status = LogByRoots(a, log);
     if (status == ErrOutOfMemory)
         return status;
     if (status < 0)
         return ErrDegenerateValue;
-    Copy(log, int64_t{n} * n, a);
+    CopyMatrix<E>(log, a);
     return failure == ErrDegenerateValue && status == 0 ? WarnSingular : status;
 }
 
 } // namespace
 
-ErrorCode MatrixRelativeError(const CDB *a, const CDB *b, int32_t n, double *error) {
-    const int64_t count = int64_t{n} * n;
-    *error = std::numeric_limits<double>::quiet_NaN();
-    if (CheckFinite(a, count) != 0 || CheckFinite(b, count) != 0)
+ErrorCode MatrixLogarithm(ComplexMatrix a) {
+    QX_EXPECTS(a.isSquare() && !a.isEmpty());
+    if (!AllFinite<E>(a))
         return ErrNonFiniteInput;
-    double difference = 0.0, first = 0.0, second = 0.0;
-    for (int64_t i = 0; i < count; ++i) {
-        difference = std::max(difference, std::sqrt(SquaredModulus(a[i] - b[i])));
-        first = std::max(first, std::sqrt(SquaredModulus(a[i])));
-        second = std::max(second, std::sqrt(SquaredModulus(b[i])));
+    if (IsDiagonal<E>(a)) {
+        for (int32_t i = 0; i < a.rows(); ++i)
+            if (const ErrorCode failed = TakeLogarithm(&a(i, i)))
+                return failed;
+        return 0;
     }
-    *error = difference / (first + second);
-    return 0;
-}
-
-ErrorCode LogByEigen(const CDB *a, int32_t n, CDB *log) {
-    const int64_t count = int64_t{n} * n;
-    Block blocks;
-    if (const ErrorCode failed = blocks.allocate(2 * count + n))
-        return failed;
-    CDB *const vectors = blocks.data(), *const inverse = vectors + count,
-               *const values = inverse + count;
-    if (const ErrorCode failed =
-            CxEigenGeneral(a, n, generalMatrix, eigenValuesAndVectors, values, vectors))
-        return failed;
-    double condition;
-    if (ConditionNumber(vectors, n, n, twoNorm, &condition) == ErrOutOfMemory)
-        return ErrOutOfMemory;
-    if (!(condition <= 1e14))
-        return ErrConditionTooHigh;
-    if (const ErrorCode failed = TakeLogarithms(values, 1, n))
-        return failed;
-    if (const ErrorCode failed = InvertByLU(vectors, n, inverse))
-        return failed;
-    for (int64_t i = 0; i < count; ++i)
-        vectors[i] = vectors[i] * values[i % n];
-    return MatrixProductPlain(vectors, inverse, n, n, n, log);
-}
-
-ErrorCode LogByRoots(const CDB *a, int32_t n, CDB *log, int32_t terms, double radius) {
-    const int64_t count = int64_t{n} * n;
-    Block blocks;
-    if (const ErrorCode failed = blocks.allocate(4 * count))
-        return failed;
-    CDB *const root = blocks.data(), *const distance = root + count, *power = distance + count,
-               *product = power + count;
-    Copy(a, count, root);
-    ErrorCode status = 0;
-    int32_t roots = 0;
-    for (;; ++roots) {
-        double norm;
-        SubtractIdentity(root, n, distance);
-        if (const ErrorCode failed = MatrixNorm(distance, n, n, frobeniusNorm, &norm))
-            return failed;
-        if (!(norm > radius))
-            break;
-        if (roots == 100)
-            return ErrIterationLimit;
-        status = MatrixSquareRoot(root, n);
-        if (status < 0)
-            return status;
-    }
-    // y = 1 - root; log(root) = -(y + y^2 / 2 + ...)
-    for (int64_t i = 0; i < count; ++i)
-        log[i] = power[i] = distance[i] = -distance[i];
-    for (int32_t j = 1; j < terms; ++j) {
-        if (const ErrorCode failed = MatrixProductPlain(power, distance, n, n, n, product))
-            return failed;
-        CDB *const held = power;
-        power = product;
-        product = held;
-        const double factor = 1.0 / (j + 1);
-        for (int64_t i = 0; i < count; ++i)
-            log[i] += power[i] * factor;
-    }
-    const double scale = -1.0 * std::ldexp(1.0, roots);
-    for (int64_t i = 0; i < count; ++i)
-        log[i] = log[i] * scale;
-    return status;
-}
-
-ErrorCode MatrixLogarithm(CDB *a, int32_t n) {
-    if (n < 1)
-        return ErrEmptyInput;
-    const int64_t count = int64_t{n} * n;
-    if (CheckFinite(a, count) != 0)
-        return ErrNonFiniteInput;
-    if (IsDiagonal<ElementType::CDB>(a, n))
-        return TakeLogarithms(a, std::ptrdiff_t{n} + 1, n);
-    Refinement refinement(a, n);
+    Refinement refinement(a);
     if (const ErrorCode failed = refinement.allocate())
         return failed;
-    CDB *const log = refinement.log();
-    for (int64_t i = 0; i < count; ++i)
-        log[i] = {0.0, 0.0};
-    ErrorCode status = LogByEigen(a, n, log);
+    const ComplexMatrix log = refinement.log();
+    for (CDB &element : log.elements())
+        element = {0.0, 0.0};
+    ErrorCode status = LogByEigen(a, log);
     if (status == ErrDegenerateValue || status == ErrConditionTooHigh)
-        return FallBackOnRoots(a, n, log, status);
+        return FallBackOnRoots(a, log, status);
     if (status < 0 && status != ErrSingularMatrix)
         return status;
     if (!refinement.isExact(&status))
         status = status < 0 ? status : refinement.improve();
     if (status < 0)
         return status;
-    Copy(log, count, a);
+    CopyMatrix<E>(log, a);
     return status;
 }
 

@@ -120,24 +120,24 @@ void Update(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, const typename
 
 } // namespace
 
-void AddProduct(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, const DBL *a,
-                std::ptrdiff_t aStride, const DBL *b, std::ptrdiff_t bStride, DBL *c,
-                std::ptrdiff_t cStride) {
+void AddProductReal(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, const DBL *a,
+                    std::ptrdiff_t aStride, const DBL *b, std::ptrdiff_t bStride, DBL *c,
+                    std::ptrdiff_t cStride) {
     Update<Real, false>(m, n, k, a, aStride, b, bStride, c, cStride);
 }
-void SubtractProduct(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, const DBL *a,
-                     std::ptrdiff_t aStride, const DBL *b, std::ptrdiff_t bStride, DBL *c,
-                     std::ptrdiff_t cStride) {
+void SubtractProductReal(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, const DBL *a,
+                         std::ptrdiff_t aStride, const DBL *b, std::ptrdiff_t bStride, DBL *c,
+                         std::ptrdiff_t cStride) {
     Update<Real, true>(m, n, k, a, aStride, b, bStride, c, cStride);
 }
-void CxAddProduct(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, const CDB *a,
-                  std::ptrdiff_t aStride, const CDB *b, std::ptrdiff_t bStride, CDB *c,
-                  std::ptrdiff_t cStride) {
-    Update<Complex, false>(m, n, k, a, aStride, b, bStride, c, cStride);
-}
-void CxSubtractProduct(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, const CDB *a,
+void AddProductComplex(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, const CDB *a,
                        std::ptrdiff_t aStride, const CDB *b, std::ptrdiff_t bStride, CDB *c,
                        std::ptrdiff_t cStride) {
+    Update<Complex, false>(m, n, k, a, aStride, b, bStride, c, cStride);
+}
+void SubtractProductComplex(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, const CDB *a,
+                            std::ptrdiff_t aStride, const CDB *b, std::ptrdiff_t bStride, CDB *c,
+                            std::ptrdiff_t cStride) {
     Update<Complex, true>(m, n, k, a, aStride, b, bStride, c, cStride);
 }
 

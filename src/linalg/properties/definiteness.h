@@ -1,39 +1,35 @@
 #ifndef QX_LINALG_PROPERTIES_DEFINITENESS_H
 #define QX_LINALG_PROPERTIES_DEFINITENESS_H
 
-#include "qx/types.h"
-
-#include <cstdint>
+#include "linalg/matrix.h"
 
 namespace qx {
 
-// Tests of square matrices; the answer is 1 or 0.
+// Tests of square matrices that are not empty; the answer is 1 or 0.
 
 // Whether |a[i][j] - a[j][i]| is nowhere above the limit: the tolerance, but at least 0; or, with
 // `relative`, n tolerance M with M the largest |a[i][j]|, where a negative tolerance is the machine
 // epsilon. `hermitian` compares with the conjugate, and so looks at the diagonal, too.
-// ErrEmptyInput, ErrNonFiniteInput.
-ErrorCode CheckSymmetric(const DBL *a, int32_t n, double tolerance, int32_t relative,
+// ErrNonFiniteInput.
+template <ElementType E>
+ErrorCode CheckSymmetric(ConstMatrixView<E> a, double tolerance, bool relative, bool hermitian,
                          int32_t *isSymmetric);
-ErrorCode CheckSymmetric(const CDB *a, int32_t n, double tolerance, int32_t relative,
-                         int32_t hermitian, int32_t *isSymmetric);
 
 // Whether a matrix is exactly symmetric (Hermitian) and all its eigenvalues are above the machine
-// epsilon times the largest modulus of them.
+// epsilon times the largest modulus of them. NaN counts as a difference.
 // ErrNonFiniteInput, ErrOutOfMemory, ErrIterationLimit.
-ErrorCode CheckPositiveDefinite(const DBL *a, int32_t n, int32_t *isDefinite);
-ErrorCode CheckPositiveDefinite(const CDB *a, int32_t n, int32_t *isDefinite);
+template <ElementType E>
+ErrorCode CheckPositiveDefinite(ConstMatrixView<E> a, int32_t *isDefinite);
 
 // Whether a matrix is positive semi-definite, by an elimination that takes the largest diagonal
 // element first. With t the tolerance (n machine epsilons if negative) times the largest diagonal
 // element: the matrix must be symmetric (Hermitian) within t; a diagonal element above t is
 // eliminated with and counts one to the rank; when none is left, all the rest must vanish within t.
 // The rank is -1 where the answer is 0.
-// ErrEmptyInput, ErrNonFiniteInput, ErrOutOfMemory.
-ErrorCode CheckPositiveSemiDefinite(const DBL *a, int32_t n, double tolerance,
-                                    int32_t *isSemiDefinite, int32_t *rank);
-ErrorCode CheckPositiveSemiDefinite(const CDB *a, int32_t n, double tolerance,
-                                    int32_t *isSemiDefinite, int32_t *rank);
+// ErrNonFiniteInput, ErrOutOfMemory.
+template <ElementType E>
+ErrorCode CheckPositiveSemiDefinite(ConstMatrixView<E> a, double tolerance, int32_t *isSemiDefinite,
+                                    int32_t *rank);
 
 } // namespace qx
 

@@ -1,17 +1,14 @@
 #ifndef QX_LINALG_PROPERTIES_VECTORS_H
 #define QX_LINALG_PROPERTIES_VECTORS_H
 
-#include "qx/types.h"
-
-#include <cstdint>
+#include "linalg/matrix.h"
 
 namespace qx {
 
-// The p-norm (sum |x[i]|^p)^(1/p); for p = +infinity the largest and for -infinity the smallest
-// |x[i]|. With `scaleToUnit` x is divided by a norm that is finite and not 0.
-// ErrEmptyInput, ErrNonFiniteInput (p is NaN), ErrTooFewWeights (p is 0).
-ErrorCode VectorNorm(DBL *x, int32_t n, double p, DBL *norm, int32_t scaleToUnit);
-ErrorCode VectorNorm(CDB *x, int32_t n, double p, DBL *norm, int32_t scaleToUnit);
+// The p-norm (sum |x[i]|^p)^(1/p) of a vector that is not empty; for p = +infinity the largest and
+// for -infinity the smallest |x[i]|. p is neither 0 nor NaN.
+template <ElementType E>
+double VectorNorm(ConstVectorView<E> x, double p);
 
 } // namespace qx
 

@@ -1,31 +1,27 @@
 #ifndef QX_LINALG_SYSTEMS_BANDED_H
 #define QX_LINALG_SYSTEMS_BANDED_H
 
-#include "qx/types.h"
-
-#include <cstdint>
+#include "linalg/matrix.h"
 
 namespace qx {
 
-// Solves a band system in place of b, n by `rightSides`. Row upper + i - j, column j of `band`
-// holds a(i, j); band has lower + upper + 1 rows of n.
-//
-// ErrEmptyInput, ErrSizesDisagree (a count of bands is negative, or both are above n together),
-// ErrOutOfMemory, ErrSingularMatrix.
-ErrorCode SolveBand(const DBL *band, int32_t n, int32_t lower, int32_t upper, int32_t rightSides,
-                    DBL *b);
-ErrorCode SolveBand(const CDB *band, int32_t n, int32_t lower, int32_t upper, int32_t rightSides,
-                    CDB *b);
+// Solves a band system in place of b. Row upper + i - j, column j of `band` holds a(i, j); band has
+// lower + upper + 1 rows, and at least as many columns. ErrOutOfMemory, ErrSingularMatrix.
+template <ElementType E>
+ErrorCode SolveBand(ConstMatrixView<E> band, int32_t lower, int32_t upper, MatrixView<E> b);
 
-// The factors of a tridiagonal matrix in place; upper2 has n - 2 elements, pivots n, counted
-// from 1. WarnSingular.
-ErrorCode FactorTridiagonal(int32_t n, DBL *lower, DBL *diagonal, DBL *upper, DBL *upper2,
-                            I32 *pivots);
-// Solves with them in place of b, n by `rightSides`. ErrIndexOutOfRange (no such pivots),
-// ErrOutOfMemory.
-ErrorCode SolveTridiagonal(bool transposed, int32_t n, const DBL *lower, const DBL *diagonal,
-                           const DBL *upper, const DBL *upper2, const I32 *pivots,
-                           int32_t rightSides, DBL *b);
+// A tridiagonal matrix of order n by its diagonals, of which `lower` and `upper` have n - 1
+// elements; `upper2`, which only the factors have, n - 2.
+template <bool Writable>
+struct Diagonals {
+    BasicVectorView<ElementType::DBL, Writable> lower, main, upper, upper2;
+};
+
+// The factors in place; `pivots` has n elements, counted from 1. ErrOutOfMemory, WarnSingular.
+ErrorCode FactorTridiagonal(const Diagonals<true> &matrix, IndexVector pivots);
+// Solves with them in place of b. ErrIndexOutOfRange (no such pivots), ErrOutOfMemory.
+ErrorCode SolveTridiagonal(bool transposed, const Diagonals<false> &factors,
+                           ConstIndexVector pivots, RealMatrix b);
 
 } // namespace qx
 

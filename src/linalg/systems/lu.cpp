@@ -1,11 +1,7 @@
 #include "linalg/systems/lu.h"
 
-#include "frame/scratch.h"
-#include "linalg/matrix.h"
-#include "linalg/products/ordered.h"
+#include "linalg/products/products.h"
 #include "linalg/systems/substitution.h"
-
-#include <cstring>
 
 namespace qx {
 
@@ -17,21 +13,13 @@ namespace {
 constexpr int32_t fewColumns = 16;
 constexpr int32_t fewRows = 4;
 
-void SubtractTerms(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, const DBL *a, const DBL *b,
-                   DBL *c, std::ptrdiff_t stride) {
-    SubtractProduct(m, n, k, a, stride, b, stride, c, stride);
-}
-void SubtractTerms(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, const CDB *a, const CDB *b,
-                   CDB *c, std::ptrdiff_t stride) {
-    CxSubtractProduct(m, n, k, a, stride, b, stride, c, stride);
-}
-
 template <ElementType E>
 class Factorisation {
     typedef typename Element<E>::type T;
 
 public:
-    Factorisation(T *a, int32_t m, int32_t n, I32 *pivots) : a_(a), m_(m), n_(n), pivots_(pivots) {}
+    Factorisation(MatrixView<E> a, IndexVector pivots)
+        : a_(a), m_(a.rows()), n_(a.cols()), pivots_(pivots) {}
 
     ErrorCode run(int32_t *parity) {
         const int32_t steps = m_ < n_ ? m_ : n_;
@@ -45,7 +33,7 @@ public:
     }
 
 private:
-    T *row(int32_t i) const { return a_ + std::ptrdiff_t{i} * n_; }
+    T *row(int32_t i) const { return a_.row(i); }
 
     // The columns from `first` to `end`, from which the terms of the columns left of them have been
     // subtracted.
@@ -106,8 +94,13 @@ private:
     void updateRight(int32_t first, int32_t middle, int32_t end) {
         const int32_t cols = end - middle;
         updateRows(first, middle, middle, cols);
-        SubtractTerms(m_ - middle, cols, middle - first, row(middle) + first, row(first) + middle,
-                      row(middle) + middle, n_);
+        subtractTerms(first, middle, m_, middle, cols);
+    }
+    // From rows `middle` to `end`, in `cols` columns from `col` on.
+    void subtractTerms(int32_t first, int32_t middle, int32_t end, int32_t col, int32_t cols) {
+        SubtractProduct<E>(a_.block(middle, first, end - middle, middle - first),
+                           a_.block(first, col, middle - first, cols),
+                           a_.block(middle, col, end - middle, cols));
     }
     void updateRows(int32_t first, int32_t end, int32_t col, int32_t cols) {
         if (end - first <= fewRows) {
@@ -121,134 +114,112 @@ private:
         }
         const int32_t middle = first + (end - first) / 2;
         updateRows(first, middle, col, cols);
-        SubtractTerms(end - middle, cols, middle - first, row(middle) + first, row(first) + col,
-                      row(middle) + col, n_);
+        subtractTerms(first, middle, end, col, cols);
         updateRows(middle, end, col, cols);
     }
 
-    T *a_;
+    MatrixView<E> a_;
     int32_t m_, n_;
-    I32 *pivots_;
+    IndexVector pivots_;
     ErrorCode status_ = 0;
     int32_t parity_ = 0;
 };
 
 template <ElementType E>
-void Exchange(typename Element<E>::type *x, const I32 *pivots, int32_t n, int32_t rightSides) {
-    typedef typename Element<E>::type T;
-    for (int32_t k = 0; k < n; ++k) {
+void Exchange(MatrixView<E> x, ConstIndexVector pivots) {
+    typedef ElementOf<E> T;
+    for (int32_t k = 0; k < x.rows(); ++k) {
         const int32_t p = pivots[k];
         if (p == k)
             continue;
-        for (int32_t j = 0; j < rightSides; ++j) {
-            T *const upper = x + std::ptrdiff_t{k} * rightSides + j;
-            T *const lower = x + std::ptrdiff_t{p} * rightSides + j;
-            const T held = *upper;
-            *upper = *lower;
-            *lower = held;
+        for (int32_t j = 0; j < x.cols(); ++j) {
+            const T held = x(k, j);
+            x(k, j) = x(p, j);
+            x(p, j) = held;
         }
     }
 }
 
+// The factors of a copy of a matrix.
 template <ElementType E>
-ErrorCode Solve(const typename Element<E>::type *lu, const I32 *pivots,
-                const typename Element<E>::type *b, int32_t n, int32_t rightSides,
-                typename Element<E>::type *x) {
-    for (int32_t k = 0; k < n; ++k)
-        if (pivots[k] < 0 || pivots[k] >= n)
-            return ErrIndexOutOfRange;
-    if (x != b)
-        std::memmove(x, b, sizeof *b * static_cast<std::size_t>(n) * rightSides);
-    Exchange<E>(x, pivots, n, rightSides);
-    return Substitute(Factors::lu, lu, n, rightSides, x);
-}
-
-template <ElementType E>
-ErrorCode FactorCopy(const typename Element<E>::type *a, int32_t n, Scratch<E> &lu,
-                     Scratch<ElementType::I32> &pivots) {
-    const int64_t count = int64_t{n} * n;
-    if (const ErrorCode failed = lu.allocate(count))
-        return failed;
-    if (const ErrorCode failed = pivots.allocate(n))
-        return failed;
-    std::memcpy(lu.data(), a, static_cast<std::size_t>(count) * sizeof *a);
-    int32_t parity;
-    return LUDecompose(lu.data(), n, n, pivots.data(), &parity) == 0 ? 0 : ErrSingularMatrix;
-}
-
-template <ElementType E>
-ErrorCode SolveWithCopy(const typename Element<E>::type *a, int32_t n,
-                        const typename Element<E>::type *b, typename Element<E>::type *x) {
-    Scratch<E> lu;
-    Scratch<ElementType::I32> pivots;
-    if (const ErrorCode failed = FactorCopy<E>(a, n, lu, pivots))
-        return failed;
-    return LUSolve(lu.data(), pivots.data(), b, n, 1, x);
-}
+struct FactoredCopy {
+    ErrorCode make(ConstMatrixView<E> a) {
+        if (const ErrorCode failed =
+                memory.take(Sized(lu, a.rows(), a.rows()), Sized(pivots, a.rows())))
+            return failed;
+        Copy<E>(a.elements(), lu.elements());
+        int32_t parity;
+        return LUDecompose<E>(lu, pivots, &parity) == 0 ? 0 : ErrSingularMatrix;
+    }
+    ScratchParts memory;
+    MatrixView<E> lu;
+    IndexVector pivots;
+};
 
 // All columns of the unit matrix are solved for at once.
 template <ElementType E>
-ErrorCode Invert(const typename Element<E>::type *lu, const I32 *pivots, int32_t n,
-                 typename Element<E>::type *out) {
-    for (int32_t i = 0; i < n; ++i)
-        for (int32_t j = 0; j < n; ++j)
-            out[std::ptrdiff_t{i} * n + j] = ScalarOf<E>::Of(i == j ? 1.0 : 0.0);
-    return LUSolve(lu, pivots, out, n, n, out);
-}
-
-template <ElementType E>
-ErrorCode InvertCopy(const typename Element<E>::type *a, int32_t n,
-                     typename Element<E>::type *out) {
-    Scratch<E> lu;
-    Scratch<ElementType::I32> pivots;
-    if (const ErrorCode failed = FactorCopy<E>(a, n, lu, pivots))
-        return failed;
-    return Invert<E>(lu.data(), pivots.data(), n, out);
-}
-
-template <ElementType E>
-ErrorCode InvertInPlace(typename Element<E>::type *lu, const I32 *pivots, int32_t n) {
-    const int64_t count = int64_t{n} * n;
-    Scratch<E> copy;
-    if (const ErrorCode failed = copy.allocate(count))
-        return failed;
-    std::memcpy(copy.data(), lu, static_cast<std::size_t>(count) * sizeof *lu);
-    return Invert<E>(copy.data(), pivots, n, lu);
+ErrorCode Invert(ConstMatrixView<E> lu, ConstIndexVector pivots, MatrixView<E> out) {
+    SetIdentity<E>(out);
+    return LUSolve<E>(lu, pivots, out, out);
 }
 
 } // namespace
 
-ErrorCode LUDecompose(DBL *a, int32_t m, int32_t n, I32 *pivots, int32_t *parity) {
-    return Factorisation<ElementType::DBL>(a, m, n, pivots).run(parity);
+template <ElementType E>
+ErrorCode LUDecompose(MatrixView<E> a, IndexVector pivots, int32_t *parity) {
+    QX_EXPECTS(pivots.size() == a.rows());
+    return Factorisation<E>(a, pivots).run(parity);
 }
-ErrorCode LUDecompose(CDB *a, int32_t m, int32_t n, I32 *pivots, int32_t *parity) {
-    return Factorisation<ElementType::CDB>(a, m, n, pivots).run(parity);
+
+template <ElementType E>
+ErrorCode LUSolve(ConstMatrixView<E> lu, ConstIndexVector pivots, ConstMatrixView<E> b,
+                  MatrixView<E> x) {
+    QX_EXPECTS(lu.isSquare() && pivots.size() == lu.rows() && b.rows() == lu.rows() &&
+               x.rows() == b.rows() && x.cols() == b.cols());
+    for (const int32_t pivot : pivots)
+        if (pivot < 0 || pivot >= lu.rows())
+            return ErrIndexOutOfRange;
+    if (x.data() != b.data())
+        Copy<E>(b.elements(), x.elements());
+    Exchange<E>(x, pivots);
+    return Substitute<E>(Factors::lu, lu.elements(), x);
 }
-ErrorCode LUSolve(const DBL *lu, const I32 *pivots, const DBL *b, int32_t n, int32_t rightSides,
-                  DBL *x) {
-    return Solve<ElementType::DBL>(lu, pivots, b, n, rightSides, x);
+
+template <ElementType E>
+ErrorCode SolveByLU(ConstMatrixView<E> a, ConstVectorView<E> b, VectorView<E> x) {
+    FactoredCopy<E> factored;
+    if (const ErrorCode failed = factored.make(a))
+        return failed;
+    return LUSolve<E>(factored.lu, factored.pivots, AsColumn(b), AsColumn(x));
 }
-ErrorCode LUSolve(const CDB *lu, const I32 *pivots, const CDB *b, int32_t n, int32_t rightSides,
-                  CDB *x) {
-    return Solve<ElementType::CDB>(lu, pivots, b, n, rightSides, x);
+
+template <ElementType E>
+ErrorCode InvertByLU(ConstMatrixView<E> a, MatrixView<E> out) {
+    FactoredCopy<E> factored;
+    if (const ErrorCode failed = factored.make(a))
+        return failed;
+    return Invert<E>(factored.lu, factored.pivots, out);
 }
-ErrorCode SolveByLU(const DBL *a, int32_t n, const DBL *b, DBL *x) {
-    return SolveWithCopy<ElementType::DBL>(a, n, b, x);
+
+template <ElementType E>
+ErrorCode InvertFactors(MatrixView<E> lu, ConstIndexVector pivots) {
+    MatrixView<E> copy;
+    ScratchParts memory;
+    if (const ErrorCode failed = memory.take(Sized(copy, lu.rows(), lu.rows())))
+        return failed;
+    Copy<E>(lu.elements(), copy.elements());
+    return Invert<E>(copy, pivots, lu);
 }
-ErrorCode SolveByLU(const CDB *a, int32_t n, const CDB *b, CDB *x) {
-    return SolveWithCopy<ElementType::CDB>(a, n, b, x);
-}
-ErrorCode InvertByLU(const DBL *a, int32_t n, DBL *out) {
-    return InvertCopy<ElementType::DBL>(a, n, out);
-}
-ErrorCode InvertByLU(const CDB *a, int32_t n, CDB *out) {
-    return InvertCopy<ElementType::CDB>(a, n, out);
-}
-ErrorCode InvertFactors(DBL *lu, const I32 *pivots, int32_t n) {
-    return InvertInPlace<ElementType::DBL>(lu, pivots, n);
-}
-ErrorCode InvertFactors(CDB *lu, const I32 *pivots, int32_t n) {
-    return InvertInPlace<ElementType::CDB>(lu, pivots, n);
-}
+
+template ErrorCode LUDecompose(RealMatrix, IndexVector, int32_t *);
+template ErrorCode LUDecompose(ComplexMatrix, IndexVector, int32_t *);
+template ErrorCode LUSolve(ConstRealMatrix, ConstIndexVector, ConstRealMatrix, RealMatrix);
+template ErrorCode LUSolve(ConstComplexMatrix, ConstIndexVector, ConstComplexMatrix, ComplexMatrix);
+template ErrorCode SolveByLU(ConstRealMatrix, ConstRealVector, RealVector);
+template ErrorCode SolveByLU(ConstComplexMatrix, ConstComplexVector, ComplexVector);
+template ErrorCode InvertByLU(ConstRealMatrix, RealMatrix);
+template ErrorCode InvertByLU(ConstComplexMatrix, ComplexMatrix);
+template ErrorCode InvertFactors(RealMatrix, ConstIndexVector);
+template ErrorCode InvertFactors(ComplexMatrix, ConstIndexVector);
 
 } // namespace qx

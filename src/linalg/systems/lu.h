@@ -1,11 +1,11 @@
 #ifndef QX_LINALG_SYSTEMS_LU_H
 #define QX_LINALG_SYSTEMS_LU_H
 
-#include "qx/types.h"
-
-#include <cstdint>
+#include "linalg/matrix.h"
 
 namespace qx {
+
+// Matrices here have no gaps between their rows.
 
 // Factors P a = L U in place, m by n, by rows with the largest pivot of each column: Crout's order
 // of arithmetic, a[i][k] minus a[i][j] a[j][k] term by term, j ascending. L has a unit diagonal.
@@ -13,27 +13,26 @@ namespace qx {
 // for an even or odd number of exchanges. Ties take the earlier row; NaN is never a pivot.
 //
 // WarnSingular where a column has no pivot other than 0; the factors are complete all the same.
-ErrorCode LUDecompose(DBL *a, int32_t m, int32_t n, I32 *pivots, int32_t *parity);
-ErrorCode LUDecompose(CDB *a, int32_t m, int32_t n, I32 *pivots, int32_t *parity);
+template <ElementType E>
+ErrorCode LUDecompose(MatrixView<E> a, IndexVector pivots, int32_t *parity);
 
-// Solves with the factors of a square matrix: n by `rightSides`, row after row; x may be b.
+// Solves with the factors of a square matrix; x may be b.
 // ErrIndexOutOfRange (a pivot is no row of the matrix), ErrOutOfMemory.
-ErrorCode LUSolve(const DBL *lu, const I32 *pivots, const DBL *b, int32_t n, int32_t rightSides,
-                  DBL *x);
-ErrorCode LUSolve(const CDB *lu, const I32 *pivots, const CDB *b, int32_t n, int32_t rightSides,
-                  CDB *x);
+template <ElementType E>
+ErrorCode LUSolve(ConstMatrixView<E> lu, ConstIndexVector pivots, ConstMatrixView<E> b,
+                  MatrixView<E> x);
 
 // a x = b for a square a; the inputs stay. ErrOutOfMemory, ErrSingularMatrix.
-ErrorCode SolveByLU(const DBL *a, int32_t n, const DBL *b, DBL *x);
-ErrorCode SolveByLU(const CDB *a, int32_t n, const CDB *b, CDB *x);
+template <ElementType E>
+ErrorCode SolveByLU(ConstMatrixView<E> a, ConstVectorView<E> b, VectorView<E> x);
 
 // The inverse; out may be a. ErrOutOfMemory, ErrSingularMatrix.
-ErrorCode InvertByLU(const DBL *a, int32_t n, DBL *out);
-ErrorCode InvertByLU(const CDB *a, int32_t n, CDB *out);
+template <ElementType E>
+ErrorCode InvertByLU(ConstMatrixView<E> a, MatrixView<E> out);
 
 // The inverse from the factors, in their place. ErrIndexOutOfRange, ErrOutOfMemory.
-ErrorCode InvertFactors(DBL *lu, const I32 *pivots, int32_t n);
-ErrorCode InvertFactors(CDB *lu, const I32 *pivots, int32_t n);
+template <ElementType E>
+ErrorCode InvertFactors(MatrixView<E> lu, ConstIndexVector pivots);
 
 } // namespace qx
 

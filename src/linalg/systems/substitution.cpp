@@ -1,25 +1,26 @@
 #include "linalg/systems/substitution.h"
 
-#include "frame/scratch.h"
+#include "linalg/matrix.h"
 
 namespace qx {
 
-ErrorCode Substitute(Factors factors, const DBL *a, int32_t n, int32_t rightSides, DBL *x) {
+template <ElementType E>
+ErrorCode Substitute(Factors factors, ConstVectorView<E> a, MatrixView<E> x) {
+    const int32_t n = x.rows(), rightSides = x.cols();
+    QX_EXPECTS(x.isWhole() &&
+               a.size() == (factors == Factors::lu ? int64_t{n} * n : PackedLength(n)));
     Scratch<ElementType::DBL> strip;
     if (rightSides > 1)
         if (const ErrorCode failed = strip.allocate(int64_t{n} * stripWidth))
             return failed;
-    SubstituteStrips(factors, a, n, rightSides, x, strip.data());
+    if constexpr (E == ElementType::DBL)
+        SubstituteStrips(factors, a.data(), n, rightSides, x.data(), strip.data());
+    else
+        CxSubstituteStrips(factors, a.data(), n, rightSides, x.data(), strip.data());
     return 0;
 }
 
-ErrorCode Substitute(Factors factors, const CDB *a, int32_t n, int32_t rightSides, CDB *x) {
-    Scratch<ElementType::DBL> strip;
-    if (rightSides > 1)
-        if (const ErrorCode failed = strip.allocate(int64_t{n} * stripWidth))
-            return failed;
-    CxSubstituteStrips(factors, a, n, rightSides, x, strip.data());
-    return 0;
-}
+template ErrorCode Substitute(Factors, ConstRealVector, RealMatrix);
+template ErrorCode Substitute(Factors, ConstComplexVector, ComplexMatrix);
 
 } // namespace qx

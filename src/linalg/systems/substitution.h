@@ -1,8 +1,9 @@
 #ifndef QX_LINALG_SYSTEMS_SUBSTITUTION_H
 #define QX_LINALG_SYSTEMS_SUBSTITUTION_H
 
+#include "frame/views.h"
 #include "frame/widths.h"
-#include "qx/types.h"
+#include "qx/errors.h"
 
 #include <cstdint>
 
@@ -16,13 +17,13 @@ enum class Factors {
     cholesky // the packed lower triangle, then its conjugate transpose
 };
 
-// Solves in place for all right sides, x being n by `rightSides`, row after row. The order of
-// arithmetic is that of a single right side:
+// Solves in place for all right sides, the columns of x, which has no gaps between its rows. The
+// order of arithmetic is that of a single right side:
 //   lu           a sum of products in ascending order, subtracted from the element, for each row
 //   packed ones  each unknown's multiple is subtracted from all later elements at once
 // No pivot is tested. ErrOutOfMemory, for more than one right side.
-ErrorCode Substitute(Factors factors, const DBL *a, int32_t n, int32_t rightSides, DBL *x);
-ErrorCode Substitute(Factors factors, const CDB *a, int32_t n, int32_t rightSides, CDB *x);
+template <ElementType E>
+ErrorCode Substitute(Factors factors, ConstVectorView<E> a, MatrixView<E> x);
 
 // The same with memory for the strips of columns that pass through the substitution together: n
 // times `stripWidth` doubles, or none for a single right side.

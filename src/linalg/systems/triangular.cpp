@@ -1,21 +1,17 @@
 #include "linalg/systems/triangular.h"
 
-#include "frame/scratch.h"
 #include "linalg/factorisations/cholesky.h"
-#include "linalg/matrix.h"
 #include "linalg/systems/substitution.h"
-
-#include <cstring>
 
 namespace qx {
 
 namespace {
 
 template <ElementType E>
-bool HasSmallPivot(const typename Element<E>::type *packed, int32_t n, int32_t triangle) {
+bool HasSmallPivot(ConstVectorView<E> packed, int32_t n, Triangle triangle) {
     double largest = 0.0;
-    for (int64_t i = 0; i < PackedLength(n); ++i) {
-        const double size = Modulus(packed[i]);
+    for (const ElementOf<E> &element : packed) {
+        const double size = Modulus(element);
         largest = size > largest ? size : largest;
     }
     std::ptrdiff_t diagonal = 0;
@@ -27,59 +23,49 @@ bool HasSmallPivot(const typename Element<E>::type *packed, int32_t n, int32_t t
     return false;
 }
 
+} // namespace
+
 template <ElementType E>
-ErrorCode Solve(const typename Element<E>::type *packed, int32_t n, int32_t triangle,
-                int32_t rightSides, typename Element<E>::type *x) {
-    if (CheckFinite(packed, PackedLength(n)) != 0 || CheckFinite(x, int64_t{n} * rightSides) != 0)
+ErrorCode SolveTriangular(ConstVectorView<E> packed, Triangle triangle, MatrixView<E> x) {
+    QX_EXPECTS(packed.size() == PackedLength(x.rows()));
+    QX_EXPECTS(triangle == lowerTriangle || triangle == upperTriangle);
+    if (!AllFinite<E>(packed) || !AllFinite<E>(x))
         return ErrNonFiniteInput;
-    if (HasSmallPivot<E>(packed, n, triangle))
+    if (HasSmallPivot<E>(packed, x.rows(), triangle))
         return ErrSingularMatrix;
     const Factors factors = triangle == upperTriangle ? Factors::upperPacked : Factors::lowerPacked;
-    return Substitute(factors, packed, n, rightSides, x);
+    return Substitute<E>(factors, packed, x);
 }
 
 template <ElementType E>
-ErrorCode SolveDefinite(const typename Element<E>::type *a, int32_t n, int32_t useUpper,
-                        const typename Element<E>::type *b, int32_t rightSides,
-                        typename Element<E>::type *x) {
-    const int64_t count = int64_t{n} * rightSides;
-    if (CheckFinite(a, int64_t{n} * n) != 0 || CheckFinite(b, count) != 0)
+ErrorCode CholeskySolve(ConstMatrixView<E> a, Triangle read, ConstMatrixView<E> b,
+                        MatrixView<E> x) {
+    const int32_t n = a.rows();
+    QX_EXPECTS(a.isSquare() && b.rows() == n && x.rows() == n && x.cols() == b.cols());
+    if (!AllFinite<E>(a) || !AllFinite<E>(b))
         return ErrNonFiniteInput;
-    Scratch<E> packed;
-    if (const ErrorCode failed = packed.allocate(PackedLength(n)))
+    VectorView<E> packed;
+    ScratchParts memory;
+    if (const ErrorCode failed = memory.take(Sized(packed, PackedLength(n))))
         return failed;
-    if (useUpper == 0) {
-        PackMatrix(a, n, lowerTriangle, packed.data());
+    if (read == lowerTriangle) {
+        PackMatrix<E>(a, lowerTriangle, packed);
     } else {
         // The rows of the upper triangle are the columns of the lower one, conjugated.
         std::ptrdiff_t next = 0;
         for (std::ptrdiff_t i = 0; i < n; ++i)
             for (std::ptrdiff_t j = i; j < n; ++j)
-                packed[next++] = Conj(a[i * n + j]);
+                packed[next++] = Conj(a(i, j));
     }
-    if (const ErrorCode failed = PackedCholesky(packed.data(), n))
+    if (const ErrorCode failed = PackedCholesky<E>(packed, n))
         return failed;
-    std::memcpy(x, b, static_cast<std::size_t>(count) * sizeof *b);
-    return Substitute(Factors::cholesky, packed.data(), n, rightSides, x);
+    Copy<E>(b.elements(), x.elements());
+    return Substitute<E>(Factors::cholesky, packed, x);
 }
 
-} // namespace
-
-ErrorCode SolveTriangular(const DBL *packed, int32_t n, int32_t triangle, int32_t rightSides,
-                          DBL *x) {
-    return Solve<ElementType::DBL>(packed, n, triangle, rightSides, x);
-}
-ErrorCode SolveTriangular(const CDB *packed, int32_t n, int32_t triangle, int32_t rightSides,
-                          CDB *x) {
-    return Solve<ElementType::CDB>(packed, n, triangle, rightSides, x);
-}
-ErrorCode CholeskySolve(const DBL *a, int32_t n, int32_t useUpper, const DBL *b, int32_t rightSides,
-                        DBL *x) {
-    return SolveDefinite<ElementType::DBL>(a, n, useUpper, b, rightSides, x);
-}
-ErrorCode CholeskySolve(const CDB *a, int32_t n, int32_t useUpper, const CDB *b, int32_t rightSides,
-                        CDB *x) {
-    return SolveDefinite<ElementType::CDB>(a, n, useUpper, b, rightSides, x);
-}
+template ErrorCode SolveTriangular(ConstRealVector, Triangle, RealMatrix);
+template ErrorCode SolveTriangular(ConstComplexVector, Triangle, ComplexMatrix);
+template ErrorCode CholeskySolve(ConstRealMatrix, Triangle, ConstRealMatrix, RealMatrix);
+template ErrorCode CholeskySolve(ConstComplexMatrix, Triangle, ConstComplexMatrix, ComplexMatrix);
 
 } // namespace qx

@@ -21,22 +21,25 @@ using qx::test::Contents;
 using qx::test::DBL2DArray;
 using qx::test::DBLArray;
 using qx::test::Deviation;
+using qx::test::elementIn;
 using qx::test::Exact;
 using qx::test::FromUnitary;
 using qx::test::Matrix;
 using qx::test::MatrixKind;
 using qx::test::MatrixKinds;
 using qx::test::RealMatrix;
+using qx::test::View;
 
 // |a v - w v| is within 4 n eps |a| |v| for every column v of v, and v has unit length. Balancing
 // makes that true of the balanced matrix, so it is held against that; where the scales of rows and
 // columns lie far apart the two differ.
-template <qx::ElementType E, class Elements>
+template <class Elements>
 void ExpectEigenpairs(const Elements &a, int n, const std::vector<CDB> &w,
                       const std::vector<CDB> &v) {
+    constexpr qx::ElementType E = elementIn<Elements>;
     Elements balanced = a;
     std::vector<double> scale(n);
-    const qx::Balanced range = qx::Balance<E>(balanced.data(), n, n, false, true, scale.data());
+    const qx::Balanced range = qx::Balance<E>(View(balanced, n, n), false, true, View(scale));
     ASSERT_EQ(range.high, n - 1);
     Exact A(n, n, a.data()), V(n, n, v.data());
     for (int j = 0; j < n; ++j) {
@@ -60,30 +63,24 @@ void ExpectEigenpairs(const Elements &a, int n, const std::vector<CDB> &w,
     }
 }
 
+template <class Elements>
+void ExpectEigenproblemSolved(const Elements &a, int n) {
+    constexpr qx::ElementType E = elementIn<Elements>;
+    std::vector<CDB> w(n), v(n * n), alone(n);
+    ASSERT_EQ(qx::EigenGeneral<E>(View(a, n, n), View(w), View(v, n, n)), 0);
+    ExpectEigenpairs(a, n, w, v);
+    ASSERT_EQ(qx::EigenGeneral<E>(View(a, n, n), View(alone)), 0);
+    for (int i = 0; E == qx::ElementType::DBL && i < n; ++i) {
+        const bool lower = i > 0 && w[i].im < 0.0;
+        EXPECT_EQ(w[i].im, lower ? -w[i - 1].im : std::abs(w[i].im)) << i;
+    }
+}
 TEST(EigenGeneral, PairsSatisfyTheirEquation) {
     for (const int n : {1, 2, 3, 4, 7, 20, 50})
         for (const MatrixKind &kind : MatrixKinds()) {
             SCOPED_TRACE(testing::Message() << kind.name << ", order " << n);
-            const std::vector<double> a = RealMatrix(kind, n, n);
-            std::vector<CDB> w(n), v(n * n), alone(n);
-            ASSERT_EQ(qx::EigenGeneral(a.data(), n, 1, w.data(), v.data()), 0);
-            ExpectEigenpairs<qx::ElementType::DBL>(a, n, w, v);
-            ASSERT_EQ(qx::EigenGeneral(a.data(), n, 0, alone.data(), nullptr), 0);
-            for (int i = 0; i < n; ++i) {
-                const bool lower = i > 0 && w[i].im < 0.0;
-                EXPECT_EQ(w[i].im, lower ? -w[i - 1].im : std::abs(w[i].im)) << i;
-            }
-        }
-}
-
-TEST(CxEigenGeneral, PairsSatisfyTheirEquation) {
-    for (const int n : {1, 2, 3, 4, 7, 20, 50})
-        for (const MatrixKind &kind : MatrixKinds()) {
-            SCOPED_TRACE(testing::Message() << kind.name << ", order " << n);
-            const std::vector<CDB> a = ComplexMatrix(kind, n, n);
-            std::vector<CDB> w(n), v(n * n);
-            ASSERT_EQ(qx::CxEigenGeneral(a.data(), n, 0, 1, w.data(), v.data()), 0);
-            ExpectEigenpairs<qx::ElementType::CDB>(a, n, w, v);
+            ExpectEigenproblemSolved(RealMatrix(kind, n, n), n);
+            ExpectEigenproblemSolved(ComplexMatrix(kind, n, n), n);
         }
 }
 
@@ -100,14 +97,15 @@ Exact Mirrored(const std::vector<T> &a, int n) {
 }
 template <class T>
 void ExpectSpectralDecomposition(const std::vector<T> &a, int n) {
+    constexpr qx::ElementType E = elementIn<std::vector<T>>;
     std::vector<double> w(n), alone(n);
     std::vector<T> v(n * n);
-    ASSERT_EQ(qx::SymmetricEigen(a.data(), n, 1, w.data(), v.data()), 0);
+    ASSERT_EQ(qx::SymmetricEigen<E>(View(a, n, n), View(w), View(v, n, n)), 0);
     const Exact V(n, n, v.data());
     EXPECT_LT(Deviation(V * Exact::Diagonal(n, w.data()) * V.adjoint(), Mirrored(a, n)), 4.0);
     EXPECT_LT(FromUnitary(V), 8.0);
     EXPECT_TRUE(std::is_sorted(w.begin(), w.end()));
-    ASSERT_EQ(qx::SymmetricEigen(a.data(), n, 0, alone.data(), static_cast<T *>(nullptr)), 0);
+    ASSERT_EQ(qx::SymmetricEigen<E>(View(a, n, n), View(alone), {}), 0);
     EXPECT_EQ(alone, w);
 }
 TEST(SymmetricEigen, GivesTheMatrixBackFromOrthonormalVectors) {

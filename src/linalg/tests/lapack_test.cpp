@@ -16,6 +16,7 @@ namespace {
 
 using qx::test::Complexes;
 using qx::test::Reals;
+using qx::test::View;
 
 typedef std::complex<long double> Exact;
 
@@ -41,20 +42,20 @@ double ErrorOfProduct(const std::vector<T> &a, const std::vector<T> &b, const st
     return static_cast<double>(error / scale);
 }
 
+constexpr auto Multiply = &qx::MatrixProduct<qx::ElementType::DBL>;
+
 TEST(Products, TransposesAndConjugates) {
     const int m = 37, n = 21;
-    auto a = Complexes(m * n, 1);
+    const auto a = Complexes(m * n, 1);
     std::vector<CDB> t(m * n), product(m * m);
-    qx::TransposeMatrix(a.data(), m, n, t.data());
+    qx::CopyTransposed<qx::ElementType::CDB>(View(a, m, n), View(t, n, m));
     for (int i = 0; i < m; ++i)
         for (int j = 0; j < n; ++j)
             EXPECT_EQ(t[j * m + i].im, a[i * n + j].im);
-    ASSERT_EQ(qx::ProductWithConjugate(a.data(), a.data(), m, n, m, product.data()), 0);
+    ASSERT_EQ(qx::ProductWithConjugate(View(a, m, n), View(a, m, n), View(product, m, m)), 0);
     for (CDB &z : t)
         z = qx::Conj(z);
     EXPECT_LT(ErrorOfProduct(a, t, product, m, n, m), 8e-16);
-    qx::TransposeMatrix(t.data(), n, m, nullptr); // in place
-    EXPECT_EQ(t[5 * n + 3].im, -a[5 * n + 3].im);
 }
 
 TEST(Lapack, BandAndTridiagonalDriversSolve) {
@@ -87,22 +88,22 @@ TEST(Blas, RefusesCallersWithoutMemory) {
             callers.push_back(std::make_unique<qx::BlasMemory>());
         while (*callers.back() && callers.size() < 5000);
         ASSERT_LT(callers.size(), 5000U);
-        EXPECT_EQ(qx::MatrixProductPlain(a.data(), a.data(), n, n, n, c.data()), ErrOutOfMemory);
+        EXPECT_EQ(Multiply(View(a, n, n), View(a, n, n), View(c, n, n)), ErrOutOfMemory);
     }
-    EXPECT_EQ(qx::MatrixProductPlain(a.data(), a.data(), n, n, n, c.data()), 0);
+    EXPECT_EQ(Multiply(View(a, n, n), View(a, n, n), View(c, n, n)), 0);
 }
 
 TEST(Blas, ThreadsAtOnceGetTheBitsOfOneAlone) {
     const int n = 150;
     const auto a = Reals(n * n, 1), b = Reals(n * n, 2);
     std::vector<double> expected(n * n);
-    qx::MatrixProductPlain(a.data(), b.data(), n, n, n, expected.data());
+    Multiply(View(a, n, n), View(b, n, n), View(expected, n, n));
     std::vector<std::vector<double>> results(8, std::vector<double>(n * n));
     std::vector<std::thread> threads;
     for (auto &c : results)
         threads.emplace_back([&] {
             for (int round = 0; round < 20; ++round)
-                qx::MatrixProductPlain(a.data(), b.data(), n, n, n, c.data());
+                Multiply(View(a, n, n), View(b, n, n), View(c, n, n));
         });
     for (std::thread &thread : threads)
         thread.join();

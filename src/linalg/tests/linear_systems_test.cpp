@@ -21,8 +21,10 @@ using qx::operator*;
 using qx::operator+=;
 using qx::test::Complexes;
 using qx::test::Deviation;
+using qx::test::elementIn;
 using qx::test::Exact;
 using qx::test::Reals;
+using qx::test::View;
 
 typedef qx::test::Array1D<ElementType::DBL> DBLVector;
 typedef qx::test::Array1D<ElementType::CDB> CDBVector;
@@ -55,13 +57,16 @@ TEST(LU, SolvesAndInvertsBackwardStably) {
             const auto zb = Complexes(n, 5);
             std::vector<double> x(b.size());
             std::vector<CDB> zx(zb.size());
-            const ErrorCode status = qx::SolveByLU(a.data(), n, b.data(), x.data());
+            const ErrorCode status =
+                qx::SolveByLU<ElementType::DBL>(View(a, n, n), View(b), View(x));
             if (status == 0 && std::isfinite(x[0])) {
                 EXPECT_LT(BackwardError(a, n, b, x), 4.0);
             } else {
                 EXPECT_TRUE(status == 0 || status == ErrSingularMatrix);
             }
-            if (qx::SolveByLU(za.data(), n, zb.data(), zx.data()) == 0 && std::isfinite(zx[0].re)) {
+            const ErrorCode cxStatus =
+                qx::SolveByLU<ElementType::CDB>(View(za, n, n), View(zb), View(zx));
+            if (cxStatus == 0 && std::isfinite(zx[0].re)) {
                 EXPECT_LT(BackwardError(za, n, zb, zx), 4.0);
             }
         }
@@ -70,15 +75,16 @@ TEST(LU, SolvesAndInvertsBackwardStably) {
 // All right sides at once, as the inverse is made, and one by one: the same bits.
 template <class T>
 void ExpectStripsLikeSingles(const std::vector<T> &a, int n) {
+    constexpr ElementType E = elementIn<std::vector<T>>;
     std::vector<T> lu = a, inverse(a.size());
     std::vector<int32_t> pivots(n);
     int32_t parity;
-    ASSERT_EQ(qx::LUDecompose(lu.data(), n, n, pivots.data(), &parity), 0);
-    ASSERT_EQ(qx::InvertByLU(a.data(), n, inverse.data()), 0);
+    ASSERT_EQ(qx::LUDecompose<E>(View(lu, n, n), View(pivots), &parity), 0);
+    ASSERT_EQ(qx::InvertByLU<E>(View(a, n, n), View(inverse, n, n)), 0);
     for (int j = 0; j < n; ++j) {
         std::vector<T> column(n, T{});
         reinterpret_cast<double &>(column[j]) = 1.0;
-        qx::LUSolve(lu.data(), pivots.data(), column.data(), n, 1, column.data());
+        qx::LUSolve<E>(View(lu, n, n), View(pivots), View(column, n, 1), View(column, n, 1));
         for (int i = 0; i < n; ++i)
             ASSERT_EQ(std::memcmp(&column[i], &inverse[i * n + j], sizeof(T)), 0) << i << " " << j;
     }
@@ -92,6 +98,8 @@ TEST(LU, AnInverseHasTheBitsOfItsColumns) {
         ExpectStripsLikeSingles(Complexes(n * n, 3), n);
     }
 }
+
+constexpr auto Decompose = &qx::LUDecompose<ElementType::DBL>;
 
 // The order of arithmetic is the plain one whatever the panels do: with a row of numbers that
 // swallow each other the last bits tell it.
@@ -107,7 +115,7 @@ TEST(LU, SubtractsTermsInAscendingOrder) {
     }
     std::vector<int32_t> pivots(n);
     int32_t parity;
-    EXPECT_EQ(qx::LUDecompose(a.data(), n, n, pivots.data(), &parity), WarnSingular);
+    EXPECT_EQ(Decompose(View(a, n, n), View(pivots), &parity), WarnSingular);
     EXPECT_EQ(a[n * n - 1], 0.0);
 }
 
@@ -115,15 +123,16 @@ TEST(LU, TellsSingularityAndGoesOn) {
     std::vector<double> a = {0, 0, 2, 0, 0, 3, 0, 5, 1};
     std::vector<int32_t> pivots(3);
     int32_t parity = 7;
-    EXPECT_EQ(qx::LUDecompose(a.data(), 3, 3, pivots.data(), &parity), WarnSingular);
+    EXPECT_EQ(Decompose(View(a, 3, 3), View(pivots), &parity), WarnSingular);
     EXPECT_EQ(pivots, (std::vector<int32_t>{0, 2, 2}));
     EXPECT_EQ(parity, 1);
+    pivots.resize(2);
     // Ties keep the earlier row, and NaN is never a pivot.
     std::vector<double> ties = {-1, 2, 1, 3};
-    qx::LUDecompose(ties.data(), 2, 2, pivots.data(), &parity);
+    Decompose(View(ties, 2, 2), View(pivots), &parity);
     EXPECT_EQ(pivots[0], 0);
     std::vector<double> withNaN = {nan, 2, 1, 3};
-    EXPECT_EQ(qx::LUDecompose(withNaN.data(), 2, 2, pivots.data(), &parity), WarnSingular);
+    EXPECT_EQ(Decompose(View(withNaN, 2, 2), View(pivots), &parity), WarnSingular);
     EXPECT_EQ(pivots[0], 1);
 }
 
@@ -181,12 +190,16 @@ TEST(LeastSquares, SatisfyTheNormalEquations) {
         const auto za = Complexes(m * n, 1), zb = Complexes(m, 2);
         std::vector<double> x(n), pseudo(n * m);
         std::vector<CDB> zx(n);
-        ASSERT_EQ(qx::SolveBySVD(a.data(), m, n, b.data(), 1, x.data(), -1.0), 0);
+        ASSERT_EQ(
+            qx::SolveBySVD<ElementType::DBL>(View(a, m, n), View(b, m, 1), View(x, n, 1), -1.0), 0);
         ExpectLeastSquares(a, m, n, b, x);
-        ASSERT_EQ(qx::SolveBySVD(za.data(), m, n, zb.data(), 1, zx.data(), -1.0), 0);
+        ASSERT_EQ(
+            qx::SolveBySVD<ElementType::CDB>(View(za, m, n), View(zb, m, 1), View(zx, n, 1), -1.0),
+            0);
         ExpectLeastSquares(za, m, n, zb, zx);
         // The four conditions of Penrose, of which the products and their symmetry tell all.
-        ASSERT_EQ(qx::PseudoInverseMatrix(a.data(), m, n, -1.0, pseudo.data()), 0);
+        ASSERT_EQ(
+            qx::PseudoInverseMatrix<ElementType::DBL>(View(a, m, n), -1.0, View(pseudo, n, m)), 0);
         const Exact A(m, n, a.data()), P(n, m, pseudo.data());
         EXPECT_LT(Deviation(A * P * A, A), 100.0);
         EXPECT_LT(Deviation(P * A * P, P), 100.0);
@@ -242,11 +255,11 @@ TEST(LeastSquares, RefinementReducesTheResidual) {
     for (int i = 0; i < n; ++i)
         for (int j = 0; j < n; ++j)
             b[i] += a[i * n + j];
-    std::vector<double> once(n), thrice(n), work(1000);
-    ASSERT_EQ(qx::SolveBySVDRefined(work.data(), a.data(), n, n, b.data(), once.data(), -1.0, 1),
-              0);
-    ASSERT_EQ(qx::SolveBySVDRefined(work.data(), a.data(), n, n, b.data(), thrice.data(), -1.0, 3),
-              0);
+    std::vector<double> once(n), thrice(n), work(qx::LeastSquaresWork(n, n) + 2 * n);
+    for (const auto &[refinements, x] : {std::pair(1, &once), std::pair(3, &thrice)})
+        ASSERT_EQ(
+            qx::SolveBySVDRefined(View(work), View(a, n, n), View(b), View(*x), -1.0, refinements),
+            0);
     EXPECT_LE(BackwardError(a, n, b, thrice), BackwardError(a, n, b, once));
     EXPECT_LT(BackwardError(a, n, b, thrice), 0.5);
 }
@@ -255,13 +268,13 @@ TEST(LeastSquares, RefinementReducesTheResidual) {
 TEST(LeastSquares, RefinementsWithoutEndEnd) {
     const int n = 4;
     for (const double scale : {1.0, 1e300}) {
-        std::vector<double> a, b(n, 1.0), work(1000);
+        std::vector<double> a, b(n, 1.0), work(qx::LeastSquaresWork(n, n) + 2 * n);
         for (int i = 0; i < n * n; ++i)
             a.push_back(scale / (1 + i / n + i % n));
         std::vector<std::vector<double>> steps;
         const auto solve = [&](int32_t refinements) {
             std::vector<double> x(n);
-            EXPECT_EQ(qx::SolveBySVDRefined(work.data(), a.data(), n, n, b.data(), x.data(), -1.0,
+            EXPECT_EQ(qx::SolveBySVDRefined(View(work), View(a, n, n), View(b), View(x), -1.0,
                                             refinements),
                       0);
             return x;
@@ -460,7 +473,7 @@ TEST(LinearSystems, OfDifferentThreadsHaveTheBitsOfOne) {
     const auto solve = [](int t) {
         const auto a = Reals(n * n, 10 + t), b = Reals(n, 20 + t);
         Solutions found = {std::vector<double>(n), {}};
-        qx::SolveByLU(a.data(), n, b.data(), found.byElimination.data());
+        qx::SolveByLU<ElementType::DBL>(View(a, n, n), View(b), View(found.byElimination));
         const DBLMatrix band(diagonals, n, Reals(diagonals * n, 30 + t));
         const DBLMatrix right(n, columns, Reals(n * columns, 40 + t));
         BandEqsSetDriH(band.handle(), right.handle(), diagonals / 2, diagonals / 2);

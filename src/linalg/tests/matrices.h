@@ -1,6 +1,7 @@
 #ifndef QX_LINALG_TESTS_MATRICES_H
 #define QX_LINALG_TESTS_MATRICES_H
 
+#include "frame/views.h"
 #include "tests/support/recipe.h"
 
 #include <cmath>
@@ -25,6 +26,27 @@ inline std::vector<CDB> Complexes(int count, uint64_t seed) {
         z.im = noise.symmetric();
     }
     return x;
+}
+
+// Views of vectors' elements, for inner routines.
+inline qx::RealMatrix View(std::vector<double> &a, int m, int n) { return {a.data(), m, n}; }
+inline qx::ComplexMatrix View(std::vector<CDB> &a, int m, int n) { return {a.data(), m, n}; }
+inline ConstRealMatrix View(const std::vector<double> &a, int m, int n) { return {a.data(), m, n}; }
+inline ConstComplexMatrix View(const std::vector<CDB> &a, int m, int n) { return {a.data(), m, n}; }
+// The code of what a vector holds.
+template <class Vector>
+constexpr ElementType elementIn = ElementType::DBL;
+template <>
+inline constexpr ElementType elementIn<std::vector<CDB>> = ElementType::CDB;
+template <>
+inline constexpr ElementType elementIn<std::vector<int32_t>> = ElementType::I32;
+template <class T>
+VectorView<elementIn<std::vector<T>>> View(std::vector<T> &x) {
+    return {x.data(), static_cast<std::ptrdiff_t>(x.size())};
+}
+template <class T>
+ConstVectorView<elementIn<std::vector<T>>> View(const std::vector<T> &x) {
+    return {x.data(), static_cast<std::ptrdiff_t>(x.size())};
 }
 
 // The kinds of matrices on which factorisations are tried: element (i, j) of an m by n matrix.
