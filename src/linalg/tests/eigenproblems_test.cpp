@@ -1,9 +1,9 @@
 #include "linalg/eigenproblems/general.h"
 #include "linalg/eigenproblems/symmetric.h"
 #include "linalg/factorisations/balance.h"
-#include "linalg/tests/exact.h"
 #include "linalg/tests/host_matrix.h"
 #include "linalg/tests/matrices.h"
+#include "linalg/tests/residuals.h"
 #include "qx/qx.h"
 
 #include <gtest/gtest.h>
@@ -23,45 +23,13 @@ using qx::test::DBLArray;
 using qx::test::Deviation;
 using qx::test::elementIn;
 using qx::test::Exact;
+using qx::test::ExpectEigenpairs;
 using qx::test::FromUnitary;
 using qx::test::Matrix;
 using qx::test::MatrixKind;
 using qx::test::MatrixKinds;
 using qx::test::RealMatrix;
 using qx::test::View;
-
-// |a v - w v| is within 4 n eps |a| |v| for every column v of v, and v has unit length. Balancing
-// makes that true of the balanced matrix, so it is held against that; where the scales of rows and
-// columns lie far apart the two differ.
-template <class Elements>
-void ExpectEigenpairs(const Elements &a, int n, const std::vector<CDB> &w,
-                      const std::vector<CDB> &v) {
-    constexpr qx::ElementType E = elementIn<Elements>;
-    Elements balanced = a;
-    std::vector<double> scale(n);
-    const qx::Balanced range = qx::Balance<E>(View(balanced, n, n), false, true, View(scale));
-    ASSERT_EQ(range.high, n - 1);
-    Exact A(n, n, a.data()), V(n, n, v.data());
-    for (int j = 0; j < n; ++j) {
-        long double squares = 0;
-        for (int i = 0; i < n; ++i)
-            squares += std::norm(V(i, j));
-        EXPECT_NEAR(static_cast<double>(squares), 1.0, 4e-16 * (n + 4));
-        for (int i = 0; i < n; ++i) {
-            A(i, j) *= static_cast<long double>(scale[j]) / scale[i];
-            V(i, j) /= scale[i];
-        }
-    }
-    const Exact difference = A * V - V * Exact::Diagonal(n, w.data());
-    for (int j = 0; j < n; ++j) {
-        long double squares = 0, length = 0;
-        for (int i = 0; i < n; ++i) {
-            squares += std::norm(difference(i, j));
-            length += std::norm(V(i, j));
-        }
-        EXPECT_LE(std::sqrt(squares), 4.0L * n * 0x1p-52L * A.norm() * std::sqrt(length)) << j;
-    }
-}
 
 template <class Elements>
 void ExpectEigenproblemSolved(const Elements &a, int n) {

@@ -92,18 +92,6 @@ private:
     std::vector<Number> a_;
 };
 
-// |a - b| / |b| in units of n eps, with the larger dimension of b as n.
-inline double Deviation(const Exact &a, const Exact &b) {
-    const long double unit = std::max(b.rows(), b.cols()) * 0x1p-52L;
-    const long double size = b.norm(), difference = (a - b).norm();
-    return static_cast<double>((size == 0 ? difference : difference / size) / unit);
-}
-// How far the columns are from orthonormal, in the same unit.
-inline double FromUnitary(const Exact &q) {
-    const long double difference = (q.adjoint() * q - Exact::Identity(q.cols())).norm();
-    return static_cast<double>(difference / (std::max(q.rows(), q.cols()) * 0x1p-52L));
-}
-
 } // namespace qx::test
 
 #endif

@@ -1,6 +1,6 @@
-#include "linalg/tests/exact.h"
 #include "linalg/tests/host_matrix.h"
 #include "linalg/tests/matrices.h"
+#include "linalg/tests/residuals.h"
 #include "qx/qx.h"
 
 #include <gtest/gtest.h>

@@ -3,9 +3,9 @@
 #include "linalg/matrix.h"
 #include "linalg/systems/least_squares.h"
 #include "linalg/systems/lu.h"
-#include "linalg/tests/exact.h"
 #include "linalg/tests/host_matrix.h"
 #include "linalg/tests/matrices.h"
+#include "linalg/tests/residuals.h"
 
 #include <gtest/gtest.h>
 
@@ -19,10 +19,13 @@ namespace {
 using qx::ElementType;
 using qx::operator*;
 using qx::operator+=;
+using qx::test::BackwardError;
 using qx::test::Complexes;
 using qx::test::Deviation;
 using qx::test::elementIn;
 using qx::test::Exact;
+using qx::test::ExpectLeastSquares;
+using qx::test::ExpectPseudoInverse;
 using qx::test::Reals;
 using qx::test::View;
 
@@ -34,17 +37,6 @@ typedef qx::test::CDB2DArray CDBMatrix;
 
 constexpr double inf = std::numeric_limits<double>::infinity();
 const double nan = std::numeric_limits<double>::quiet_NaN();
-
-// |b - a x| / (|a| |x|) in units of n eps: the backward error of a solution.
-template <class T>
-double BackwardError(const std::vector<T> &a, int n, const std::vector<T> &b,
-                     const std::vector<T> &x) {
-    const int columns = static_cast<int>(b.size()) / n;
-    const Exact A(n, n, a.data()), X(n, columns, x.data());
-    const Exact residual = Exact(n, columns, b.data()) - A * X;
-    const long double scale = A.norm() * X.norm() * n * 0x1p-52L;
-    return scale == 0 ? 0 : static_cast<double>(residual.norm() / scale);
-}
 
 // Every regular kind of matrix, and orders on both sides of the panels and strips.
 TEST(LU, SolvesAndInvertsBackwardStably) {
@@ -174,15 +166,6 @@ TEST(LinearSystems, SingularAndNonFiniteSystems) {
               ErrNotAvailable);
 }
 
-// The minimum-norm solution: x is in the row space, and the residual is orthogonal to the columns.
-template <class T>
-void ExpectLeastSquares(const std::vector<T> &a, int m, int n, const std::vector<T> &b,
-                        const std::vector<T> &x) {
-    const Exact A(m, n, a.data()), X(n, 1, x.data()), B(m, 1, b.data());
-    const Exact residual = B - A * X;
-    EXPECT_LT(static_cast<double>((A.adjoint() * residual).norm() / (A.norm() * B.norm())),
-              1e-14 * (m + n));
-}
 TEST(LeastSquares, SatisfyTheNormalEquations) {
     for (const auto &[m, n] : {std::pair(7, 3), {3, 7}, {40, 40}, {1, 1}, {50, 20}}) {
         SCOPED_TRACE(testing::Message() << m << " by " << n);
@@ -197,14 +180,9 @@ TEST(LeastSquares, SatisfyTheNormalEquations) {
             qx::SolveBySVD<ElementType::CDB>(View(za, m, n), View(zb, m, 1), View(zx, n, 1), -1.0),
             0);
         ExpectLeastSquares(za, m, n, zb, zx);
-        // The four conditions of Penrose, of which the products and their symmetry tell all.
         ASSERT_EQ(
             qx::PseudoInverseMatrix<ElementType::DBL>(View(a, m, n), -1.0, View(pseudo, n, m)), 0);
-        const Exact A(m, n, a.data()), P(n, m, pseudo.data());
-        EXPECT_LT(Deviation(A * P * A, A), 100.0);
-        EXPECT_LT(Deviation(P * A * P, P), 100.0);
-        EXPECT_LT(Deviation((A * P).adjoint(), A * P), 100.0);
-        EXPECT_LT(Deviation((P * A).adjoint(), P * A), 100.0);
+        ExpectPseudoInverse(Exact(m, n, a.data()), Exact(n, m, pseudo.data()));
     }
 }
 

@@ -1,6 +1,6 @@
-#include "linalg/tests/exact.h"
 #include "linalg/tests/host_matrix.h"
 #include "linalg/tests/matrices.h"
+#include "linalg/tests/residuals.h"
 #include "qx/qx.h"
 
 #include <gtest/gtest.h>
@@ -24,6 +24,7 @@ using qx::test::MatrixKind;
 using qx::test::MatrixKinds;
 using qx::test::RealMatrix;
 using qx::test::Reals;
+using qx::test::ResidualRatio;
 
 typedef std::vector<double> Elements;
 
@@ -40,16 +41,6 @@ ErrorCode Lyapunov(const Array &a, const Array &q, int32_t equation, Array &x) {
         return Lyapunov2011_head(a.handle(), q.handle(), equation, x.handle());
     else
         return CxLyapunov2011_head(a.handle(), q.handle(), equation, x.handle());
-}
-
-// The residual in long double, in units of eps (|a| + |b|) |x| or eps (|a| |b| + 1) |x|.
-double ResidualRatio(const Exact &a, const Exact &b, const Exact &c, int32_t equation,
-                     const Exact &x) {
-    const Exact residual = equation == 0   ? a * x - (c - x * b)
-                           : equation == 1 ? a * x - x * b - c
-                                           : a * x * b - x - c;
-    const long double size = equation == 2 ? a.norm() * b.norm() + 1 : a.norm() + b.norm();
-    return static_cast<double>(residual.norm() / (0x1p-52L * size * x.norm()));
 }
 
 // Solves all equations; those that are singular as stated are left out. Returns how many were

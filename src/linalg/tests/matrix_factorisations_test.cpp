@@ -1,8 +1,8 @@
 #include "linalg/factorisations/qr.h"
 #include "linalg/factorisations/svd.h"
-#include "linalg/tests/exact.h"
 #include "linalg/tests/host_matrix.h"
 #include "linalg/tests/matrices.h"
+#include "linalg/tests/residuals.h"
 #include "qx/qx.h"
 
 #include <gtest/gtest.h>

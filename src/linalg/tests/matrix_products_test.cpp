@@ -1,8 +1,8 @@
 #include "qx/matrix_products.h"
 
-#include "linalg/tests/exact.h"
 #include "linalg/tests/host_matrix.h"
 #include "linalg/tests/matrices.h"
+#include "linalg/tests/residuals.h"
 #include "qx/errors.h"
 
 #include <gtest/gtest.h>

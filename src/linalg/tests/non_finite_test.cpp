@@ -177,8 +177,8 @@ std::vector<Refuser<E>> Factorisations() {
          }},
     };
     for (const int32_t choice : {0, 1, 2}) {
-        const std::string name = " " + std::to_string(choice);
-        all.push_back({"qrd" + name,
+        const std::string name = std::to_string(choice);
+        all.push_back({"qrd " + name,
                        [=](M a, M) {
                            M q, r;
                            return ErrOf(Twin<E>(qrd_head, Cxqrd_head), a.handle(), &choice,
@@ -186,7 +186,7 @@ std::vector<Refuser<E>> Factorisations() {
                        },
                        Rectangular});
         for (const int32_t pivoting : {0, 1})
-            all.push_back({"QRDec" + name + (pivoting != 0 ? ", pivoted" : ""),
+            all.push_back({"QRDec " + name + (pivoting != 0 ? ", pivoted" : ""),
                            [=](M a, M) {
                                M q, r;
                                I32_2DArray permutation;
@@ -197,14 +197,14 @@ std::vector<Refuser<E>> Factorisations() {
                            Rectangular});
     }
     for (const int32_t job : {0, 1, 2, 3})
-        all.push_back({"MatrixBalance " + std::to_string(job), [=](M a, M) {
+        all.push_back({std::to_string(job) + " MatrixBalance", [=](M a, M) {
                            Reals scale;
                            int32_t low, high;
                            return Twin<E>(MatrixBalance_head, CxMatrixBalance_head)(
                                a.handle(), job, &low, &high, scale.handle());
                        }});
     for (const int32_t order : {0, 1, 4})
-        all.push_back({"Schur80 " + std::to_string(order), [=](M a, M) {
+        all.push_back({std::to_string(order) + " Schur80", [=](M a, M) {
                            M u;
                            Complexes w;
                            return Twin<E>(Schur80_head, CxSchur80_head)(a.handle(), 1, order,
@@ -256,7 +256,7 @@ std::vector<Refuser<E>> TwoMatrices() {
                                &k, &l);
                        }});
         for (const int32_t equation : {0, 1})
-            all.push_back({"Lyapunov" + name + " " + std::to_string(equation),
+            all.push_back({"Lyapunov" + name + (equation == 0 ? ", continuous" : ", discrete"),
                            [=](M a, M) {
                                const M unit = Unit<E>(a.rows());
                                M x;
@@ -268,18 +268,17 @@ std::vector<Refuser<E>> TwoMatrices() {
     }
     for (const int place : {0, 1, 2})
         for (const int32_t equation : {0, 1, 2})
-            all.push_back(
-                {"Sylvester " + std::to_string(equation) + ", input " + std::to_string(place),
-                 [=](M a, M) {
-                     const M unit = Unit<E>(a.rows());
-                     M x;
-                     const auto at = [&](int input) {
-                         return (place == input ? a : unit).handle();
-                     };
-                     return Twin<E>(Sylvester2011_head, CxSylvester2011_head)(at(0), at(1), at(2),
-                                                                              equation, x.handle());
-                 },
-                 LargestIsFine});
+            all.push_back({std::to_string(equation) + " Sylvester, input " + std::to_string(place),
+                           [=](M a, M) {
+                               const M unit = Unit<E>(a.rows());
+                               M x;
+                               const auto at = [&](int input) {
+                                   return (place == input ? a : unit).handle();
+                               };
+                               return Twin<E>(Sylvester2011_head, CxSylvester2011_head)(
+                                   at(0), at(1), at(2), equation, x.handle());
+                           },
+                           LargestIsFine});
     return all;
 }
 
@@ -319,20 +318,20 @@ std::vector<Refuser<E>> Properties() {
          }},
     };
     for (const int32_t type : {0, 1, 2, 3}) {
-        const std::string name = " " + std::to_string(type);
+        const std::string name = std::to_string(type);
         const unsigned reads = type == 0 ? Rectangular : Everything;
-        all.push_back({"Determinant" + name, [=](M a, M) {
+        all.push_back({"Determinant " + name, [=](M a, M) {
                            std::conditional_t<E == ElementType::DBL, DBL, CDB> det;
                            return ErrOf(Twin<E>(Determinant_head, CxDeterminant_head), a.handle(),
                                         &type, &det);
                        }});
-        all.push_back({"Norm" + name,
+        all.push_back({"Norm " + name,
                        [=](M a, M) {
                            DBL norm;
                            return ErrOf(Twin<E>(Norm_head, CxNorm_head), a.handle(), &type, &norm);
                        },
                        Rectangular});
-        all.push_back({"CondNumber" + name,
+        all.push_back({"CondNumber " + name,
                        [=](M a, M) {
                            DBL cond;
                            return ErrOf(Twin<E>(CondNumber_head, CxCondNumber_head), a.handle(),
@@ -373,19 +372,19 @@ std::vector<Refuser<ElementType::DBL>> RealOnly() {
          }},
     };
     for (const int32_t output : {0, 1}) {
-        const std::string name = " " + std::to_string(output);
-        all.push_back({"EigenValueVector" + name, [=](M a, M) {
+        const std::string name = std::to_string(output);
+        all.push_back({"EigenValueVector " + name, [=](M a, M) {
                            CDBArray values;
                            CDB2DArray vectors;
                            return ErrOf(EigenValueVector_head, a.handle(), &output, values.handle(),
                                         vectors.handle());
                        }});
-        all.push_back({"SymEvectorEvalue" + name, [=](M a, M) {
+        all.push_back({"SymEvectorEvalue " + name, [=](M a, M) {
                            DBLArray values;
                            return ErrOf(SymEvectorEvalue_head, a.handle(), &output,
                                         values.handle());
                        }});
-        all.push_back({"CheckSym" + name, [=](M a, M) {
+        all.push_back({"CheckSym " + name, [=](M a, M) {
                            int32_t isSymmetric;
                            return CheckSym_head(a.handle(), -1.0, output, &isSymmetric);
                        }});
@@ -399,14 +398,14 @@ std::vector<Refuser<ElementType::CDB>> ComplexOnly() {
         {"CxMatrixSqrt", [](M a, M) { return ErrOf(CxMatrixSqrt_head, a.handle()); }},
     };
     for (const int32_t choice : {0, 1}) {
-        const std::string name = " " + std::to_string(choice);
-        all.push_back({"CxEigenValueVector: Hermitian" + name, [=](M a, M) {
+        const std::string name = std::to_string(choice);
+        all.push_back({"CxEigenValueVector: type and output " + name, [=](M a, M) {
                            CDBArray values;
                            CDB2DArray vectors;
                            return ErrOf(CxEigenValueVector_head, a.handle(), &choice, &choice,
                                         values.handle(), vectors.handle());
                        }});
-        all.push_back({"CxCheckSym" + name, [=](M a, M) {
+        all.push_back({"CxCheckSym " + name, [=](M a, M) {
                            int32_t isSymmetric;
                            return CxCheckSym_head(a.handle(), -1.0, choice, choice, &isSymmetric);
                        }});
