@@ -85,6 +85,26 @@ TEST(SymmetricEigen, GivesTheMatrixBackFromOrthonormalVectors) {
         }
 }
 
+TEST(Eigenproblems, RefuseOtherSelectors) {
+    const CDB2DArray z(1, 1, {{2.0, 0.0}});
+    CDBArray values;
+    CDB2DArray vectors;
+    DBLArray realValues;
+    const int32_t good = 0;
+    for (const int32_t bad : {-1, 2}) {
+        const DBL2DArray a(1, 1, {2.0}); // the last export takes it in place
+        ErrorCode err[4] = {};
+        EigenValueVector_head(a.handle(), &bad, values.handle(), vectors.handle(), &err[0]);
+        CxEigenValueVector_head(z.handle(), &good, &bad, values.handle(), vectors.handle(),
+                                &err[1]);
+        CxEigenValueVector_head(z.handle(), &bad, &good, values.handle(), vectors.handle(),
+                                &err[2]);
+        SymEvectorEvalue_head(a.handle(), &bad, realValues.handle(), &err[3]);
+        for (const ErrorCode each : err)
+            EXPECT_EQ(each, ErrInvalidSelector) << bad;
+    }
+}
+
 TEST(Eigenproblems, ExportsFollowTheirSelectors) {
     const DBL2DArray rotation(2, 2, {0.0, -1.0, 1.0, 0.0});
     CDBArray values;

@@ -487,6 +487,18 @@ TEST(Balancing, ChecksItsRangeAndEndsOnHugeElements) {
 }
 
 // Sums whose multiples overflow, and elements that are rounded when they are scaled.
+// Before and after the block, and at both ends of the rows.
+TEST(Balancing, RefusesExchangesWithNoRow) {
+    for (const double row : {0.0, 4.0, 1e300, nan})
+        for (const int at : {0, 2}) {
+            DBLArray scale({1.0, 2.0, 3.0});
+            scale.data()[at] = row;
+            const DBL2DArray v(3, 1, {1.0, 2.0, 3.0});
+            EXPECT_EQ(EigenVBack_head(1, 0, 2, 2, scale.handle(), v.handle()), ErrIndexOutOfRange)
+                << row << " at " << at;
+        }
+}
+
 TEST(Balancing, EndsAtBothEndsOfTheExponents) {
     DBLArray scale;
     int32_t low, high;

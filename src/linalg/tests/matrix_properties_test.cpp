@@ -106,6 +106,11 @@ TEST(Norm, OfEachType) {
     }
 }
 
+TEST(Condition, IsInfiniteWhereTheInverseOverflows) {
+    for (const int type : {1, 2, 3})
+        EXPECT_EQ(Condition(DBLMatrix(2, 2, {1e-310, 0, 0, 1}), type), inf);
+}
+
 TEST(Condition, IsInfiniteForSingularMatrices) {
     for (const int type : {0, 1, 2, 3}) {
         EXPECT_EQ(Condition(DBLMatrix(2, 2, {0, 0, 0, 3}), type), inf) << type;
