@@ -215,8 +215,8 @@ ErrorCode CorrelateReal(ConstRealVector x, ConstRealVector y, int32_t algorithm,
     QX_EXPECTS(HasSizeOfConvolution(out, x, y));
     ErrorCode status = 0;
     if (algorithm == ConvolveDirectly)
-        ConvolveSliding<Real>({x.end() - 1, -1}, Length(x.size()), {y.data()}, Length(y.size()),
-                              Order::DescendingInA, out);
+        ConvolveSliding<Real>({x.data() + x.size() - 1, -1}, Length(x.size()), {y.data()},
+                              Length(y.size()), Order::DescendingInA, out);
     else if (algorithm == ConvolveByTransform)
         status = x.data() == y.data() && x.size() == y.size() ? AutoCorrelateByTransform(x, out)
                                                               : TransformReal(x, true, y, out);

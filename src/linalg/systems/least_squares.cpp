@@ -66,7 +66,7 @@ ErrorCode DecomposeIn(RealVector work, ConstRealMatrix a, ConstRealVector b,
     const int32_t m = a.rows(), n = a.cols(), k = std::min(m, n);
     svd.u = {work.data(), m, k};
     svd.s = {svd.u.data() + std::ptrdiff_t{m} * k, k};
-    svd.v = {svd.s.end(), n, k};
+    svd.v = {svd.s.data() + k, n, k};
     return SVDecompose<Real>(a, svd.u, svd.s, svd.v);
 }
 
