@@ -1,9 +1,14 @@
 """Integrals and derivatives of samples and of functions, and from acceleration to displacement.
 """
 
+from __future__ import annotations
+
 import math
+from collections.abc import Callable
+from typing import Any, Literal
 
 import numpy as np
+from numpy.typing import ArrayLike
 
 from . import windows
 from .topical import LAST, Result, along, chosen, refuse, result, served, whole_number
@@ -18,7 +23,7 @@ RULES = {"trapezoid": 0, "simpson": 1, "simpson38": 2, "boole": 3, "left": 4, "r
 DERIVATIVES = {"central": 0, "five-point": 1, "forward": 2, "backward": 3}
 
 
-def _step(function, x, dx):
+def _step(function: Any, x: Any, dx: Any) -> Any:
     """The distance between samples: dx, or that of the evenly spaced x."""
     if x is None:
         if not dx > 0:
@@ -52,7 +57,7 @@ class Quadrature(Result):
     _unpacked = ("value", "error")
 
 
-def trapezoid(y, x=None, dx=1.0, axis=LAST):
+def trapezoid(y: ArrayLike, x: ArrayLike | None = None, dx: float = 1.0, axis: int = LAST) -> Any:
     """The integral by trapezoids; here x may be spaced as it likes.
 
     Parameters
@@ -87,7 +92,7 @@ def trapezoid(y, x=None, dx=1.0, axis=LAST):
     return integrate(y, x, dx, "trapezoid", axis)
 
 
-def simpson(y, x=None, dx=1.0, axis=LAST):
+def simpson(y: ArrayLike, x: ArrayLike | None = None, dx: float = 1.0, axis: int = LAST) -> Any:
     """The integral by Simpson's rule, exact for cubic polynomials, with any number of samples from 3 on.
 
     Parameters
@@ -119,7 +124,9 @@ def simpson(y, x=None, dx=1.0, axis=LAST):
     return integrate(y, x, dx, "simpson", axis)
 
 
-def integrate(y, x=None, dx=1.0, rule="boole", axis=LAST):
+def integrate(y: ArrayLike, x: ArrayLike | None = None, dx: float = 1.0,
+              rule: Literal["trapezoid", "simpson", "simpson38", "boole", "left", "right"] = "boole",
+              axis: int = LAST) -> Any:
     """The integral by a composite rule of Newton and Cotes; what is left over of whole panels is taken
     by a one-sided formula of the same order.
 
@@ -156,7 +163,8 @@ def integrate(y, x=None, dx=1.0, rule="boole", axis=LAST):
     return along(lambda channel: core.integrate(channel, step, code), y, axis)
 
 
-def integrate2(y, dx=1.0, dy=1.0, rule="simpson"):
+def integrate2(y: ArrayLike, dx: float = 1.0, dy: float = 1.0,
+               rule: Literal["trapezoid", "simpson", "simpson38", "boole"] = "simpson") -> float:
     """The integral over both dimensions of a matrix.
 
     Parameters
@@ -189,7 +197,8 @@ def integrate2(y, dx=1.0, dy=1.0, rule="simpson"):
     return core.integrate2(as_array(y), [float(dx), float(dy)], code)
 
 
-def integrate3(y, dx=1.0, dy=1.0, dz=1.0, rule="simpson"):
+def integrate3(y: ArrayLike, dx: float = 1.0, dy: float = 1.0, dz: float = 1.0,
+               rule: Literal["trapezoid", "simpson", "simpson38", "boole"] = "simpson") -> float:
     """The integral over three dimensions.
 
     Parameters
@@ -227,7 +236,9 @@ def integrate3(y, dx=1.0, dy=1.0, dz=1.0, rule="simpson"):
                            [float(dx), float(dy), float(dz)], code)
 
 
-def cumulative(y, x=None, dx=1.0, rule="corrected", axis=LAST):
+def cumulative(y: ArrayLike, x: ArrayLike | None = None, dx: float = 1.0,
+               rule: Literal["corrected", "trapezoid", "simpson", "simpson38", "boole", "left", "right"] = "corrected",
+               axis: int = LAST) -> Any:
     """The running integral from 0 at the first sample.
 
     Parameters
@@ -268,7 +279,7 @@ def cumulative(y, x=None, dx=1.0, rule="corrected", axis=LAST):
     return along(lambda channel: _corrected(channel, step), y, axis)
 
 
-def _corrected(channel, step):
+def _corrected(channel: Any, step: Any) -> Any:
     if len(channel) < 2:
         return np.zeros(len(channel))
     found = core.cumulative(channel, step, 0)
@@ -278,7 +289,7 @@ def _corrected(channel, step):
     return found - (slopes - slopes[0]) * (step * step / 12)
 
 
-def _slopes(channel, step, code):
+def _slopes(channel: Any, step: Any, code: Any) -> Any:
     """The derivative, with samples beyond the ends from the polynomial through as many as the rule has."""
     order = {0: 2, 1: 4, 2: 1, 3: 1}[code]
     need = 2 if code == 1 else 1
@@ -293,7 +304,9 @@ def _slopes(channel, step, code):
     return core.derivative(channel, before[:need], behind[-need:], step, code)
 
 
-def derivative(y, x=None, dx=1.0, rule="central", axis=LAST):
+def derivative(y: ArrayLike, x: ArrayLike | None = None, dx: float = 1.0,
+               rule: Literal["central", "five-point", "forward", "backward"] = "central",
+               axis: int = LAST) -> Any:
     """The derivative of samples. Samples beyond the ends are those of the polynomial through the nearest
     ones, so that the order of the rule holds up to the ends.
 
@@ -349,7 +362,7 @@ _G15 = np.zeros(15)
 _G15[1::2] = np.r_[_GAUSS, _GAUSS[-2::-1]]
 
 
-def quad(f, a, b, tolerance=1e-10, limit=1000):
+def quad(f: Callable[..., Any], a: float, b: float, tolerance: float = 1e-10, limit: int = 1000) -> Quadrature:
     r"""The integral of a function from a to b, by halving of the interval where the formulas of Gauss and
     Kronrod disagree most.
 
@@ -390,7 +403,7 @@ def quad(f, a, b, tolerance=1e-10, limit=1000):
     if math.isinf(a) or math.isinf(b):
         return _quad_infinite(f, a, b, tolerance, limit)
 
-    def part(low, high):
+    def part(low: Any, high: Any) -> Any:
         half, middle = (high - low) / 2, (high + low) / 2
         values = np.asarray(f(middle + half * _X15))
         whole = half * np.sum(_K15 * values)
@@ -411,21 +424,22 @@ def quad(f, a, b, tolerance=1e-10, limit=1000):
     return Quadrature(value[()], float(error), 15 * (2 * len(parts) - 1))
 
 
-def _quad_infinite(f, a, b, tolerance, limit):
+def _quad_infinite(f: Any, a: Any, b: Any, tolerance: Any, limit: Any) -> Any:
     """By x = t / (1 - t^2), which takes -1 to 1 to all numbers."""
-    def place(x):
+    def place(x: Any) -> Any:
         if math.isinf(x):
             return math.copysign(1.0, x)
         return 2 * x / (1 + math.sqrt(1 + 4 * x * x))
 
-    def changed(t):
+    def changed(t: Any) -> Any:
         rest = 1 - t * t
         return np.asarray(f(t / rest)) * ((1 + t * t) / (rest * rest))
 
     return quad(changed, place(a), place(b), tolerance, limit)
 
 
-def velocity(acceleration, fs, drift=1, cutoff=None, axis=LAST):
+def velocity(acceleration: ArrayLike, fs: float, drift: int | None = 1, cutoff: float | None = None,
+             axis: int = LAST) -> Any:
     """The velocity of a measured acceleration. What an offset of the acceleration and the unknown
     velocity at the beginning make of it, a line, is removed.
 
@@ -465,7 +479,7 @@ def velocity(acceleration, fs, drift=1, cutoff=None, axis=LAST):
     return _motion(acceleration, fs, drift, cutoff, 1, axis)
 
 
-def _motion(acceleration, fs, drift, cutoff, times, axis):
+def _motion(acceleration: Any, fs: Any, drift: Any, cutoff: Any, times: Any, axis: Any) -> Any:
     from . import filters
     if not fs > 0:
         refuse("calculus.velocity", "fs", f"must be above 0; {fs} came", "ErrSamplingNotPositive")
@@ -479,7 +493,7 @@ def _motion(acceleration, fs, drift, cutoff, times, axis):
     return found
 
 
-def _driftless(channel, order):
+def _driftless(channel: Any, order: Any) -> Any:
     """The values less a polynomial of least squares under a Blackman window, in which vibrations of some
     periods and more leave next to nothing."""
     n = len(channel)
@@ -488,7 +502,8 @@ def _driftless(channel, order):
     return channel - core.velocity(np.linspace(-1, 1, n), channel, order, weights, 0, [], [])[0]
 
 
-def displacement(acceleration, fs, drift=2, cutoff=None, axis=LAST):
+def displacement(acceleration: ArrayLike, fs: float, drift: int | None = 2, cutoff: float | None = None,
+                 axis: int = LAST) -> Any:
     """The displacement of a measured acceleration. What an offset of the acceleration, and velocity and
     place at the beginning make of it, a parabola, is removed.
 

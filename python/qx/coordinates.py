@@ -5,7 +5,12 @@ point (1, 0, 0) gets a negative y. Three Euler angles turn the system three time
 of the system as it has been turned so far; the direction matrix is :math:`R = R_3 R_2 R_1`.
 """
 
+from __future__ import annotations
+
+from typing import Any, Literal
+
 import numpy as np
+from numpy.typing import ArrayLike, NDArray
 
 from .topical import Result, chosen, refuse, result, served
 
@@ -34,17 +39,17 @@ class EulerAngles(Result):
     angle3: float
 
 
-def _points(function, *coordinates):
+def _points(function: Any, *coordinates: Any) -> Any:
     """Coordinates of points as arrays of one dimension, and their common shape."""
     arrays = np.broadcast_arrays(*(np.asarray(one, float) for one in coordinates))
     return [one.ravel() for one in arrays], arrays[0].shape
 
 
-def _shaped(found, shape):
+def _shaped(found: Any, shape: Any) -> Any:
     return tuple(one.reshape(shape)[()] for one in found)
 
 
-def rotate2(x, y, angle):
+def rotate2(x: ArrayLike, y: ArrayLike, angle: float) -> tuple[Any, Any]:
     r"""Coordinates of points of the plane in a system turned by an angle.
 
     .. math:: x' = x \cos\alpha + y \sin\alpha,\quad y' = y \cos\alpha - x \sin\alpha
@@ -75,7 +80,7 @@ def rotate2(x, y, angle):
     return _shaped(core.rotate2(*given, float(angle)), shape)
 
 
-def rotate(x, y, z, direction):
+def rotate(x: ArrayLike, y: ArrayLike, z: ArrayLike, direction: ArrayLike) -> tuple[Any, Any, Any]:
     """Coordinates of points of space in the system that a direction matrix gives.
 
     Parameters
@@ -104,7 +109,8 @@ def rotate(x, y, z, direction):
     return _shaped(core.rotate(*given, np.asarray(direction, float)), shape)
 
 
-def rotate_euler(x, y, z, angles, sequence="ZYX"):
+def rotate_euler(x: ArrayLike, y: ArrayLike, z: ArrayLike, angles: tuple[float, float, float],
+                 sequence: str = "ZYX") -> tuple[Any, Any, Any]:
     """Coordinates of points of space in the system turned by three Euler angles.
 
     Parameters
@@ -137,14 +143,14 @@ def rotate_euler(x, y, z, angles, sequence="ZYX"):
     return _shaped(core.rotate_euler(*given, *_three("rotate_euler", angles), code), shape)
 
 
-def _three(function, angles):
+def _three(function: Any, angles: Any) -> Any:
     given = [float(angle) for angle in angles]
     if len(given) != 3:
         refuse(f"coordinates.{function}", "angles", f"three are needed; {len(given)} came", "ErrSizesDisagree")
     return given
 
 
-def euler_to_matrix(angles, sequence="ZYX"):
+def euler_to_matrix(angles: tuple[float, float, float], sequence: str = "ZYX") -> NDArray[Any]:
     """The direction matrix of three Euler angles.
 
     Parameters
@@ -177,7 +183,7 @@ def euler_to_matrix(angles, sequence="ZYX"):
     return core.euler_to_matrix(*_three("euler_to_matrix", angles), code)
 
 
-def matrix_to_euler(direction, sequence="ZYX"):
+def matrix_to_euler(direction: ArrayLike, sequence: str = "ZYX") -> EulerAngles:
     """The Euler angles of a direction matrix; at the lock, where only a sum or difference of two has a
     meaning, the third one is 0.
 
@@ -211,7 +217,9 @@ def matrix_to_euler(direction, sequence="ZYX"):
     return EulerAngles(*core.matrix_to_euler(np.asarray(direction, float), code))
 
 
-def convert(first, second, third, source, target):
+def convert(first: ArrayLike, second: ArrayLike, third: ArrayLike,
+            source: Literal["cartesian", "spherical", "cylindrical"],
+            target: Literal["cartesian", "spherical", "cylindrical"]) -> tuple[Any, Any, Any]:
     """Coordinates of points in another kind: Cartesian (x, y, z), spherical (radius, azimuth,
     inclination from the positive z axis) or cylindrical (radius, azimuth, height).
 

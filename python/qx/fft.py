@@ -8,7 +8,12 @@ Names, order of arguments, defaults and scaling are those of `numpy.fft` and `sc
 behind the scenes for each length and thread.
 """
 
+from __future__ import annotations
+
+from typing import Any, Literal
+
 import numpy as np
+from numpy.typing import ArrayLike, NDArray
 
 from .topical import LAST, along, chosen, count_of, either, refuse, served, whole_number
 
@@ -23,27 +28,28 @@ NORMS = {"backward": lambda n: 1.0, "ortho": lambda n: n**-0.5, "forward": lambd
 OPPOSITE = {"backward": "forward", "ortho": "ortho", "forward": "backward"}
 
 
-def _scaled(spectrum, function, norm, n, axis, forward=True):
+def _scaled(spectrum: Any, function: Any, norm: Any, n: Any, axis: Any, forward: Any = True) -> Any:
     """A transform as the exports scale it (only the inverse, by 1 / n) with another norm."""
     factor = chosen(function, "norm", norm, NORMS)(n) if forward else \
         chosen(function, "norm", OPPOSITE.get(norm, norm), NORMS)(n) * n
     return spectrum * factor
 
 
-def _length(function, n, x, axis):
+def _length(function: Any, n: Any, x: Any, axis: Any) -> int:
     if n is None:
         return count_of(x, axis)
     return whole_number(function, "n", n, 1, "ErrFFTSizeNotPositive")
 
 
-def _fitted(channel, n):
+def _fitted(channel: Any, n: Any) -> Any:
     """The first n values, with zeros behind where there are fewer."""
     if len(channel) >= n:
         return channel[:n]
     return np.concatenate([channel, np.zeros(n - len(channel), channel.dtype)])
 
 
-def fft(x, n=None, axis=LAST, norm="backward"):
+def fft(x: ArrayLike, n: int | None = None, axis: int = LAST,
+        norm: Literal["backward", "ortho", "forward"] = "backward") -> NDArray[np.complex128]:
     r"""The discrete Fourier transform.
 
     Parameters
@@ -82,7 +88,8 @@ def fft(x, n=None, axis=LAST, norm="backward"):
                    "fft.fft", norm, n, axis)
 
 
-def ifft(x, n=None, axis=LAST, norm="backward"):
+def ifft(x: ArrayLike, n: int | None = None, axis: int = LAST,
+         norm: Literal["backward", "ortho", "forward"] = "backward") -> NDArray[np.complex128]:
     r"""The inverse of `fft`: :math:`x_j = \frac1n \sum_k X_k e^{2\pi i j k / n}`.
 
     Parameters
@@ -121,7 +128,7 @@ def ifft(x, n=None, axis=LAST, norm="backward"):
 LONG = 1 << 15  # from here on a spectrum in half-complex form, of half the memory, is faster
 
 
-def _half(channel):
+def _half(channel: Any) -> Any:
     n = len(channel)
     if n < LONG:
         return core.rfft(channel)[:n // 2 + 1]
@@ -132,7 +139,8 @@ def _half(channel):
     return found
 
 
-def rfft(x, n=None, axis=LAST, norm="backward"):
+def rfft(x: ArrayLike, n: int | None = None, axis: int = LAST,
+         norm: Literal["backward", "ortho", "forward"] = "backward") -> NDArray[np.complex128]:
     r"""The Fourier transform of real values, at the frequencies that are not negative.
 
     Parameters
@@ -166,12 +174,13 @@ def rfft(x, n=None, axis=LAST, norm="backward"):
     """
     if n is None and norm == "backward":
         return along(_half, x, axis)
-    n = _length("fft.rfft", n, x, axis)
-    return _scaled(along(lambda channel: core.rfft_sized(channel, 0, n, 0)[:n // 2 + 1], x, axis),
-                   "fft.rfft", norm, n, axis)
+    size = _length("fft.rfft", n, x, axis)
+    return _scaled(along(lambda channel: core.rfft_sized(channel, 0, size, 0)[:size // 2 + 1], x, axis),
+                   "fft.rfft", norm, size, axis)
 
 
-def irfft(x, n=None, axis=LAST, norm="backward"):
+def irfft(x: ArrayLike, n: int | None = None, axis: int = LAST,
+          norm: Literal["backward", "ortho", "forward"] = "backward") -> NDArray[np.float64]:
     r"""The inverse of `rfft`: real values.
 
     Parameters
@@ -201,21 +210,20 @@ def irfft(x, n=None, axis=LAST, norm="backward"):
     >>> qx.fft.irfft([2, 1 - 3j, 0])
     array([ 1.,  2.,  0., -1.])
     """
-    if n is None:
-        n = 2 * (count_of(x, axis) - 1)
-    n = whole_number("fft.irfft", "n", n, 1, "ErrFFTSizeNotPositive")
+    size = whole_number("fft.irfft", "n", 2 * (count_of(x, axis) - 1) if n is None else n, 1,
+                        "ErrFFTSizeNotPositive")
 
-    def inverse(channel):
-        spectrum = np.zeros(n, complex)
-        given = min(n // 2 + 1, len(channel))
+    def inverse(channel: Any) -> Any:
+        spectrum = np.zeros(size, np.complex128)
+        given = min(size // 2 + 1, len(channel))
         spectrum[:given] = channel[:given]
         return core.irfft(spectrum)
 
     found = along(inverse, x, axis)
-    return found if norm == "backward" else _scaled(found, "fft.irfft", norm, n, axis, False)
+    return found if norm == "backward" else _scaled(found, "fft.irfft", norm, size, axis, False)
 
 
-def fft2(x):
+def fft2(x: ArrayLike) -> NDArray[np.complex128]:
     r"""The two-dimensional transform of the last two axes.
 
     .. math:: X_{rc} = \sum_a \sum_b x_{ab} e^{-2\pi i (r a / m + c b / n)}
@@ -246,7 +254,7 @@ def fft2(x):
     return _matrices("fft.fft2", lambda matrix: transform(matrix, 0, 0, *matrix.shape, 0), x)
 
 
-def ifft2(x):
+def ifft2(x: ArrayLike) -> NDArray[np.complex128]:
     """The inverse of `fft2`, with the factor 1 / (m n).
 
     Parameters
@@ -273,7 +281,7 @@ def ifft2(x):
     return _matrices("fft.ifft2", lambda matrix: core.ifft2(matrix, 0), np.asarray(x))
 
 
-def _matrices(function, transform, x):
+def _matrices(function: Any, transform: Any, x: Any) -> Any:
     if x.ndim < 2:
         refuse(function, "x", f"two dimensions are needed; {x.ndim} came", "ErrSizesDisagree")
     if x.ndim == 2:
@@ -281,7 +289,7 @@ def _matrices(function, transform, x):
     return np.stack([transform(one) for one in x.reshape(-1, *x.shape[-2:])]).reshape(x.shape)
 
 
-def fftfreq(n, d=1.0):
+def fftfreq(n: int, d: float = 1.0) -> NDArray[np.float64]:
     """The frequencies of `fft`, in cycles per unit of d.
 
     Parameters
@@ -310,7 +318,7 @@ def fftfreq(n, d=1.0):
     return np.fft.fftfreq(n, d)
 
 
-def rfftfreq(n, d=1.0):
+def rfftfreq(n: int, d: float = 1.0) -> NDArray[np.float64]:
     """The frequencies of `rfft`, in cycles per unit of d.
 
     Parameters
@@ -339,7 +347,7 @@ def rfftfreq(n, d=1.0):
     return np.fft.rfftfreq(n, d)
 
 
-def fftshift(x, axis=LAST):
+def fftshift(x: ArrayLike, axis: int = LAST) -> NDArray[Any]:
     """The spectrum with the zero frequency in the middle, at n // 2.
 
     Parameters
@@ -362,7 +370,7 @@ def fftshift(x, axis=LAST):
     return np.fft.fftshift(x, axis)
 
 
-def ifftshift(x, axis=LAST):
+def ifftshift(x: ArrayLike, axis: int = LAST) -> NDArray[Any]:
     """The inverse of `fftshift`.
 
     Parameters
@@ -387,14 +395,15 @@ def ifftshift(x, axis=LAST):
 
 # Cosine and sine transforms: the exports have the orthonormal cosine and the plain sine sums.
 
-def _unscale(found, n, axis, inverse):
+def _unscale(found: Any, n: Any, axis: Any, inverse: Any) -> Any:
     """The orthonormal type II with the factors of norm "backward", or what type III is given."""
     factors = np.full(n, (2 * n) ** (-0.5 if inverse else 0.5))
     factors[0] *= 2**-0.5 if inverse else 2**0.5
     return found * factors
 
 
-def dct(x, n=None, axis=LAST, norm="backward"):
+def dct(x: ArrayLike, n: int | None = None, axis: int = LAST,
+        norm: Literal["backward", "ortho"] = "backward") -> NDArray[np.float64]:
     r"""The cosine transform of type II.
 
     .. math:: X_k = 2 \sum_{j=0}^{n-1} x_j \cos\frac{\pi k (2j+1)}{2n}
@@ -434,7 +443,8 @@ def dct(x, n=None, axis=LAST, norm="backward"):
     return along(lambda channel: _unscale(core.dct(channel, n), n, -1, False), x, axis)
 
 
-def idct(x, n=None, axis=LAST, norm="backward"):
+def idct(x: ArrayLike, n: int | None = None, axis: int = LAST,
+         norm: Literal["backward", "ortho"] = "backward") -> NDArray[np.float64]:
     """The inverse of `dct` with the same norm.
 
     Parameters
@@ -466,14 +476,15 @@ def idct(x, n=None, axis=LAST, norm="backward"):
     n = _length("fft.idct", n, x, axis)
     ortho = chosen("fft.idct", "norm", norm, {"backward": False, "ortho": True})
 
-    def inverse(channel):
+    def inverse(channel: Any) -> Any:
         fitted = _fitted(channel, n)
         return core.idct(fitted if ortho else _unscale(fitted, n, -1, True))
 
     return along(inverse, x, axis)
 
 
-def dst(x, n=None, axis=LAST, norm="backward"):
+def dst(x: ArrayLike, n: int | None = None, axis: int = LAST,
+        norm: Literal["backward", "ortho"] = "backward") -> NDArray[np.float64]:
     r"""The sine transform of type I.
 
     .. math:: X_k = 2 \sum_{j=0}^{n-1} x_j \sin\frac{\pi (j+1)(k+1)}{n+1}
@@ -504,12 +515,13 @@ def dst(x, n=None, axis=LAST, norm="backward"):
     >>> qx.fft.dst([1.0, 0.0, 0.0]).round(6)
     array([1.414214, 2.      , 1.414214])
     """
-    n = _length("fft.dst", n, x, axis)
-    factor = chosen("fft.dst", "norm", norm, {"backward": 2.0, "ortho": (2 / (n + 1))**0.5})
-    return along(lambda channel: factor * core.dst(channel, n), x, axis)
+    size = _length("fft.dst", n, x, axis)
+    factor = chosen("fft.dst", "norm", norm, {"backward": 2.0, "ortho": (2 / (size + 1))**0.5})
+    return along(lambda channel: factor * core.dst(channel, size), x, axis)
 
 
-def idst(x, n=None, axis=LAST, norm="backward"):
+def idst(x: ArrayLike, n: int | None = None, axis: int = LAST,
+         norm: Literal["backward", "ortho"] = "backward") -> NDArray[np.float64]:
     """The inverse of `dst` with the same norm.
 
     Parameters
@@ -538,14 +550,14 @@ def idst(x, n=None, axis=LAST, norm="backward"):
     >>> qx.fft.idst(qx.fft.dst([1.0, 2.0, 4.0])).round(12)
     array([1., 2., 4.])
     """
-    n = _length("fft.idst", n, x, axis)
-    factor = chosen("fft.idst", "norm", norm, {"backward": 0.5, "ortho": ((n + 1) / 2)**0.5})
-    return along(lambda channel: factor * core.idst(_fitted(channel, n)), x, axis)
+    size = _length("fft.idst", n, x, axis)
+    factor = chosen("fft.idst", "norm", norm, {"backward": 0.5, "ortho": ((size + 1) / 2)**0.5})
+    return along(lambda channel: factor * core.idst(_fitted(channel, size)), x, axis)
 
 
 # Hartley, Hilbert, half-complex
 
-def hartley(x, axis=LAST):
+def hartley(x: ArrayLike, axis: int = LAST) -> NDArray[np.float64]:
     r"""The Hartley transform of real values.
 
     .. math:: H_k = \sum_j x_j \left(\cos\frac{2\pi j k}{n} + \sin\frac{2\pi j k}{n}\right)
@@ -575,7 +587,7 @@ def hartley(x, axis=LAST):
     return along(core.hartley, x, axis)
 
 
-def ihartley(x, axis=LAST):
+def ihartley(x: ArrayLike, axis: int = LAST) -> NDArray[np.float64]:
     """The inverse of `hartley`: the same transform with the factor 1 / n.
 
     Parameters
@@ -603,7 +615,7 @@ def ihartley(x, axis=LAST):
     return along(core.ihartley, x, axis)
 
 
-def hilbert(x, axis=LAST):
+def hilbert(x: ArrayLike, axis: int = LAST) -> NDArray[np.float64]:
     """The Hilbert transform of real values: a cosine becomes a sine, a mean becomes 0.
 
     The imaginary part of the analytic signal; `qx.spectra.analytic` returns that itself.
@@ -633,7 +645,7 @@ def hilbert(x, axis=LAST):
     return along(core.hilbert, x, axis)
 
 
-def ihilbert(x, axis=LAST):
+def ihilbert(x: ArrayLike, axis: int = LAST) -> NDArray[np.float64]:
     """The inverse of `hilbert`, up to the mean and, for even n, the highest frequency.
 
     Parameters
@@ -661,7 +673,7 @@ def ihilbert(x, axis=LAST):
     return along(core.ihilbert, x, axis)
 
 
-def half_complex(x, axis=LAST):
+def half_complex(x: ArrayLike, axis: int = LAST) -> NDArray[np.float64]:
     r"""The spectrum of real values in as many real numbers: :math:`\mathrm{Re}\,X_k` at k and
     :math:`\mathrm{Im}\,X_k` at n - k.
 
@@ -690,7 +702,7 @@ def half_complex(x, axis=LAST):
     return along(core.half_complex, x, axis)
 
 
-def ihalf_complex(x, axis=LAST):
+def ihalf_complex(x: ArrayLike, axis: int = LAST) -> NDArray[np.float64]:
     """The inverse of `half_complex`, with the factor 1 / n.
 
     Parameters
@@ -720,7 +732,8 @@ def ihalf_complex(x, axis=LAST):
 
 # Chirp-Z
 
-def czt(x, m=None, w=None, a=1.0, axis=LAST):
+def czt(x: ArrayLike, m: int | None = None, w: complex | None = None, a: complex = 1.0,
+        axis: int = LAST) -> NDArray[np.complex128]:
     r"""The chirp-Z transform: the z-transform at m points of a spiral.
 
     .. math:: X_k = \sum_j x_j\, a^{-j} w^{jk}
@@ -759,7 +772,7 @@ def czt(x, m=None, w=None, a=1.0, axis=LAST):
                   lambda channel: core.czt_complex(channel, a, w, m, 1), x, axis)
 
 
-def iczt(x, w=None, a=1.0, axis=LAST):
+def iczt(x: ArrayLike, w: complex | None = None, a: complex = 1.0, axis: int = LAST) -> NDArray[np.complex128]:
     r"""The inverse of `czt`: the values whose transform at as many points is x.
 
     Away from the whole circle the error grows exponentially with the length.
@@ -795,7 +808,8 @@ def iczt(x, w=None, a=1.0, axis=LAST):
     return along(lambda channel: core.iczt(channel, a, w, n), x, axis)
 
 
-def zoom(x, band, m=None, fs=1.0, axis=LAST):
+def zoom(x: ArrayLike, band: tuple[float, float], m: int | None = None, fs: float = 1.0,
+         axis: int = LAST) -> NDArray[np.complex128]:
     r"""The spectrum at m frequencies of a band, evenly spaced, the end excluded.
 
     Parameters

@@ -9,9 +9,14 @@ or block by block.
 Frequencies are in the unit of the sampling rate `fs`; with its default 1.0 in cycles per sample.
 """
 
+from __future__ import annotations
+
 import math
+from collections.abc import Sequence
+from typing import Any, Literal
 
 import numpy as np
+from numpy.typing import ArrayLike, NDArray
 
 from .topical import (LAST, Result, Stream, along, chosen, count_of, either, refuse, result, served, vector,
                       whole_number)
@@ -43,24 +48,24 @@ class Response(Result):
         The group delay in samples; NaN where the gain is 0.
     """
 
-    frequencies: np.ndarray
-    values: np.ndarray
-    delay: np.ndarray
+    frequencies: NDArray[Any]
+    values: NDArray[Any]
+    delay: NDArray[Any]
     _unpacked = ("frequencies", "values")
 
     @property
-    def magnitude(self):
+    def magnitude(self) -> Any:
         """The absolute value of the gain."""
         return np.abs(self.values)
 
     @property
-    def decibels(self):
+    def decibels(self) -> Any:
         """The gain in decibels, 20 lg of the magnitude."""
         with np.errstate(divide="ignore"):
             return 20 * np.log10(self.magnitude)
 
     @property
-    def phase(self):
+    def phase(self) -> Any:
         """The phase in radians, without jumps."""
         return np.unwrap(np.angle(self.values))
 
@@ -85,12 +90,15 @@ class Filter:
     array([0.0675, 0.2795, 0.5614, 0.7961])
     """
 
-    def __init__(self, b, a, is_cascade, fs=1.0, title="", main=None):
+    ripple: float  # of an equiripple filter
+
+    def __init__(self, b: Any, a: Any, is_cascade: Any, fs: Any = 1.0, title: Any = "",
+                 main: Any = None) -> None:
         self._b, self._a = np.asarray(b, float), np.asarray(a, float)
         self._b.flags.writeable = self._a.flags.writeable = False
         self._is_cascade, self.fs, self.title = is_cascade, float(fs), title
         self._main = main  # a frequency of the pass band, in cycles per sample
-        self._rings = None  # _ringing(), once it is known
+        self._rings: int | None = None  # _ringing(), once it is known
         # The memory at rest: in its size a call makes no array for it.
         sizes = [2 * (len(self._b) // 3)] if is_cascade else [max(len(self._b) - 1, 0), max(len(self._a) - 1, 0)]
         self._rest = [np.zeros(size) for size in sizes]
@@ -98,7 +106,7 @@ class Filter:
 
     # Applying
 
-    def __call__(self, x, axis=LAST):
+    def __call__(self, x: ArrayLike, axis: int = LAST) -> Any:
         """The filtered signal.
 
         Parameters
@@ -120,17 +128,19 @@ class Filter:
         """
         return either(self._run, self._run_complex, x, axis)
 
-    def _run(self, x):
+    def _run(self, x: Any) -> Any:
         if self._is_cascade:
             return core.Filter_cascade(x, 0, self._a, self._b, *self._rest, 0)[0]
         return core.Filter_direct(x, self._a, self._b, *self._rest, 0)[0]
 
-    def _run_complex(self, x):
+    def _run_complex(self, x: Any) -> Any:
         if self._is_cascade:
             return core.Filter_cascade_complex(x, 0, self._a, self._b, *self._rest_complex, 0)[0]
         return core.Filter_direct_complex(x, self._a, self._b, *self._rest_complex, 0)[0]
 
-    def zero_phase(self, x, axis=LAST, extension="odd", pad=None):
+    def zero_phase(self, x: ArrayLike, axis: int = LAST,
+                   extension: Literal["odd", "even", "constant", "none"] = "odd",
+                   pad: int | None = None) -> Any:
         r"""The signal filtered forwards and backwards: no delay, the magnitude squared.
 
         Before and behind the signal it is extended, and the memory of the filter begins as if the first
@@ -178,20 +188,20 @@ class Filter:
                    f"are values; {pad} came", "ErrSizesDisagree")
         return along(lambda channel: self._both_ways(channel, kind, pad), x, axis)
 
-    def _both_ways(self, x, kind, pad):
+    def _both_ways(self, x: Any, kind: Any, pad: Any) -> Any:
         long = np.pad(x, pad, "edge") if kind == "constant" else \
             np.pad(x, pad, "reflect", reflect_type=kind) if kind else x
         there = self._from_rest(long)
         back = self._from_rest(there[::-1])
         return back[::-1][pad:pad + len(x)]
 
-    def _from_rest(self, x):
+    def _from_rest(self, x: Any) -> Any:
         """Filtered as if the first value had always been there."""
         x = np.ascontiguousarray(x)
         return FilterStream(self, dtype=complex if x.dtype.kind == "c" else float, value=x[0])(x) \
             if len(x) else self(x)
 
-    def _ringing(self):
+    def _ringing(self) -> Any:
         """Samples until the impulse response has fallen to RINGING, by the largest pole."""
         if self._rings is None:
             largest = float(np.abs(self.poles).max(initial=0)) if self.is_iir else 0.0
@@ -199,7 +209,8 @@ class Filter:
             self._rings = max(rings, 3 * len(self._b))
         return self._rings
 
-    def stream(self, channels=None, axis=-1, dtype=float):
+    def stream(self, channels: int | None = None, axis: int = -1,
+               dtype: type[float] | type[complex] = float) -> FilterStream:
         """The filter for blocks: all blocks together give the bits of `self(x)`.
 
         Parameters
@@ -228,12 +239,12 @@ class Filter:
     # What it is
 
     @property
-    def is_iir(self):
+    def is_iir(self) -> Any:
         """Whether it has a feedback."""
         return bool(len(self._a) > (0 if self._is_cascade else 1) and np.any(self._a[not self._is_cascade:]))
 
     @property
-    def sos(self):
+    def sos(self) -> Any:
         """The second-order sections, one to a row: b0, b1, b2, 1, a1, a2, as of SciPy."""
         if self._is_cascade:
             b, a = self._b.reshape(-1, 3), self._a.reshape(-1, 2)
@@ -245,7 +256,7 @@ class Filter:
         return np.r_[np.r_[self._b, np.zeros(3 - len(self._b))], a][None] / a[0]
 
     @property
-    def ba(self):
+    def ba(self) -> Any:
         """Numerator and denominator in ascending powers of 1/z. Of a high order they lose digits;
         `sos` does not."""
         if not self._is_cascade:
@@ -256,20 +267,20 @@ class Filter:
         return b, a
 
     @property
-    def taps(self):
+    def taps(self) -> Any:
         """The impulse response of a filter without feedback."""
         if self.is_iir:
             refuse("filters.Filter.taps", "self", "a filter with feedback has no end of taps",
                    "ErrBadCoefficients")
         return self.ba[0]
 
-    def _pairs(self):
+    def _pairs(self) -> Any:
         """Numerators and denominators of the factors."""
         if self._is_cascade:
             return [(row[:3], row[3:]) for row in self.sos]
         return [self.ba]
 
-    def _roots(self, which):
+    def _roots(self, which: Any) -> Any:
         found = []
         for pair in self._pairs():
             # A polynomial in 1/z: the same number of powers in both, and the highest power of z first.
@@ -280,22 +291,22 @@ class Filter:
         return np.concatenate([*found, np.empty(0, complex)])
 
     @property
-    def poles(self):
+    def poles(self) -> Any:
         """The poles in the z plane; a filter without feedback has them all at 0."""
         return self._roots(1)
 
     @property
-    def zeros(self):
+    def zeros(self) -> Any:
         """The zeros in the z plane."""
         return self._roots(0)
 
     @property
-    def is_stable(self):
+    def is_stable(self) -> Any:
         """Whether all poles are inside the unit circle."""
         return bool(np.all(np.abs(self.poles) < 1))
 
     @property
-    def delay(self):
+    def delay(self) -> Any:
         """The group delay in samples: the one of all frequencies where the taps are symmetric, else that
         in the middle of the pass band. `response().delay` has it for each frequency."""
         if not self.is_iir:
@@ -309,7 +320,7 @@ class Filter:
             main = coarse.frequencies[np.argmax(coarse.magnitude)] / self.fs
         return float(self.response(np.array([main]), 1.0).delay[0])
 
-    def response(self, frequencies=512, fs=None):
+    def response(self, frequencies: ArrayLike = 512, fs: float | None = None) -> Response:
         """Gain, phase and group delay.
 
         Parameters
@@ -346,7 +357,7 @@ class Filter:
         delay[np.abs(values) < 1e-12] = np.nan
         return Response(frequencies, values.reshape(frequencies.shape), delay.reshape(frequencies.shape))
 
-    def plot(self, axes=None, frequencies=2048):
+    def plot(self, axes: Any = None, frequencies: ArrayLike = 2048) -> Any:
         """Draws the gain in decibels over the frequency with matplotlib.
 
         Parameters
@@ -370,13 +381,13 @@ class Filter:
         axes.grid(True, alpha=0.3)
         return axes
 
-    def __mul__(self, other):
+    def __mul__(self, other: Any) -> Any:
         """Both filters one after the other."""
         if not isinstance(other, Filter):
             return NotImplemented
         return from_sos(np.vstack([self.sos, other.sos]), self.fs)
 
-    def __repr__(self):
+    def __repr__(self) -> str:
         if self._is_cascade:
             count = len(self._b) // 3
             size = f"{count} section{'s' * (count != 1)}"
@@ -386,7 +397,7 @@ class Filter:
             size = f"{len(self._b)} taps"
         return f"Filter: {self.title + '; ' if self.title else ''}{size}"
 
-    def _repr_html_(self):
+    def _repr_html_(self) -> str:
         rows = "".join("<tr>" + "".join(f"<td>{value:.10g}</td>" for value in row) + "</tr>"
                        for row in self.sos) if self._is_cascade else ""
         head = "".join(f"<th>{name}</th>" for name in ("b0", "b1", "b2", "a0", "a1", "a2"))
@@ -394,14 +405,14 @@ class Filter:
         return f"<p>{self!r}</p>{table}"
 
 
-def _polynomial(coefficients, z):
+def _polynomial(coefficients: Any, z: Any) -> Any:
     """Ascending powers."""
     if len(coefficients) < 8:
         return np.polynomial.polynomial.polyval(z, coefficients)
     return core.Filter_polynomial(np.asarray(coefficients, complex), np.asarray(z, complex))
 
 
-def _roots(descending):
+def _roots(descending: Any) -> Any:
     """Of a polynomial, highest power first: eigenvalues of the companion matrix, and 0 for each
     coefficient of 0 at the end; coefficients of 0 at the beginning do not count."""
     kept = np.trim_zeros(descending)
@@ -421,11 +432,12 @@ class FilterStream(Stream):
     signal.
     """
 
-    def __init__(self, filter_, channels=None, axis=-1, dtype=float, value=0.0):
+    def __init__(self, filter_: Any, channels: Any = None, axis: Any = -1, dtype: Any = float,
+                 value: Any = 0.0) -> None:
         self.filter, self._value = filter_, value
         super().__init__(channels, axis, dtype)
 
-    def _start(self):
+    def _start(self) -> Any:
         """The memory as if `value` had always been there: zeros for 0, and where there is no rest."""
         f, value = self.filter, self._value
         if not f._is_cascade:
@@ -442,7 +454,7 @@ class FilterStream(Stream):
             value = inner * row[:3].sum()
         return np.array(state or np.zeros(2 * (len(f._b) // 3)), self.dtype)
 
-    def _step(self, state, block):
+    def _step(self, state: Any, block: Any) -> Any:
         f, is_complex = self.filter, self.dtype.kind == "c"
         if f._is_cascade:
             run = core.Filter_cascade_complex if is_complex else core.Filter_cascade
@@ -454,7 +466,7 @@ class FilterStream(Stream):
 
 # Design
 
-def _edges(function, kind, cutoff, fs):
+def _edges(function: Any, kind: Any, cutoff: Any, fs: Any) -> Any:
     """The code of the kind, and fl and fh, in the words that they were given in."""
     code = chosen(function, "kind", kind, KINDS)
     edges = np.atleast_1d(np.asarray(cutoff, float))
@@ -473,12 +485,12 @@ def _edges(function, kind, cutoff, fs):
     return code, float(edges[0]), float(edges[-1])
 
 
-def _main(code, fl, fh, fs):
+def _main(code: Any, fl: Any, fh: Any, fs: Any) -> Any:
     """A frequency of the pass band in cycles per sample."""
     return (0.0, 0.5 - 1e-9, math.sqrt(fl * fh) / fs, 0.0)[code]
 
 
-def _iir(name, order, levels, cutoff, kind, fs):
+def _iir(name: Any, order: Any, levels: Any, cutoff: Any, kind: Any, fs: Any) -> Any:
     function = f"filters.{name}"
     order = whole_number(function, "order", order, 1, "ErrOrderNotPositive")
     code, fl, fh = _edges(function, kind, cutoff, fs)
@@ -494,7 +506,9 @@ def _iir(name, order, levels, cutoff, kind, fs):
                   _main(code, fl, fh, fs))
 
 
-def butterworth(order, cutoff, kind="lowpass", fs=1.0):
+def butterworth(order: int, cutoff: float | tuple[float, float],
+                kind: Literal["lowpass", "highpass", "bandpass", "bandstop"] = "lowpass",
+                fs: float = 1.0) -> Filter:
     r"""A Butterworth filter: maximally flat, 3 dB down at the cutoff.
 
     .. math:: |H|^2 = \frac{1}{1 + \Omega^{2n}}
@@ -528,7 +542,9 @@ def butterworth(order, cutoff, kind="lowpass", fs=1.0):
     return _iir("butterworth", order, {}, cutoff, kind, fs)
 
 
-def chebyshev1(order, ripple, cutoff, kind="lowpass", fs=1.0):
+def chebyshev1(order: int, ripple: float, cutoff: float | tuple[float, float],
+               kind: Literal["lowpass", "highpass", "bandpass", "bandstop"] = "lowpass",
+               fs: float = 1.0) -> Filter:
     r"""A Chebyshev filter with equal ripples in the pass band.
 
     .. math:: |H|^2 = \frac{1}{1 + \varepsilon^2 T_n(\Omega)^2},\quad \varepsilon^2 = 10^{r/10} - 1
@@ -565,7 +581,9 @@ def chebyshev1(order, ripple, cutoff, kind="lowpass", fs=1.0):
     return _iir("chebyshev1", order, {"ripple": float(ripple)}, cutoff, kind, fs)
 
 
-def chebyshev2(order, attenuation, cutoff, kind="lowpass", fs=1.0):
+def chebyshev2(order: int, attenuation: float, cutoff: float | tuple[float, float],
+               kind: Literal["lowpass", "highpass", "bandpass", "bandstop"] = "lowpass",
+               fs: float = 1.0) -> Filter:
     r"""An inverse Chebyshev filter: flat in the pass band, with equal ripples in the stop band.
 
     .. math:: |H|^2 = \frac{1}{1 + 1 / (\varepsilon^2 T_n(1/\Omega)^2)},\quad
@@ -603,7 +621,9 @@ def chebyshev2(order, attenuation, cutoff, kind="lowpass", fs=1.0):
     return _iir("chebyshev2", order, {"attenuation": float(attenuation)}, cutoff, kind, fs)
 
 
-def elliptic(order, ripple, attenuation, cutoff, kind="lowpass", fs=1.0):
+def elliptic(order: int, ripple: float, attenuation: float, cutoff: float | tuple[float, float],
+             kind: Literal["lowpass", "highpass", "bandpass", "bandstop"] = "lowpass",
+             fs: float = 1.0) -> Filter:
     r"""An elliptic filter: equal ripples in both bands, and the narrowest transition.
 
     .. math:: |H|^2 = \frac{1}{1 + \varepsilon^2 R_n(\Omega)^2}
@@ -644,7 +664,8 @@ def elliptic(order, ripple, attenuation, cutoff, kind="lowpass", fs=1.0):
                 kind, fs)
 
 
-def bessel(order, cutoff, kind="lowpass", fs=1.0):
+def bessel(order: int, cutoff: float | tuple[float, float],
+           kind: Literal["lowpass", "highpass", "bandpass", "bandstop"] = "lowpass", fs: float = 1.0) -> Filter:
     r"""A Bessel filter: the flattest group delay, 3 dB down at the cutoff.
 
     .. math:: |H|^2 = \frac{B_n(0)^2}{|B_n(i\Omega)|^2}
@@ -681,7 +702,10 @@ def bessel(order, cutoff, kind="lowpass", fs=1.0):
     return _iir("bessel", order, {}, cutoff, kind, fs)
 
 
-def windowed(taps, cutoff, kind="lowpass", window="hamming", fs=1.0, scale=True):
+def windowed(taps: int, cutoff: float | tuple[float, float],
+             kind: Literal["lowpass", "highpass", "bandpass", "bandstop"] = "lowpass",
+             window: str | tuple[Any, ...] | ArrayLike = "hamming", fs: float = 1.0,
+             scale: bool = True) -> Filter:
     r"""A filter of linear phase: the ideal response cut off under a window.
 
     .. math:: h_i = w_i \frac{\sin(\omega_c (i - c))}{\pi (i - c)},\quad c = \frac{N - 1}{2}
@@ -735,7 +759,9 @@ def windowed(taps, cutoff, kind="lowpass", window="hamming", fs=1.0, scale=True)
     return Filter(h, EMPTY, False, fs, f"windowed {kind}, cutoff {shown}, fs {fs:g}", middle)
 
 
-def equiripple(taps, bands, desired, weight=None, kind="symmetric", fs=1.0):
+def equiripple(taps: int, bands: ArrayLike, desired: ArrayLike, weight: ArrayLike | None = None,
+               kind: Literal["symmetric", "differentiator", "hilbert"] = "symmetric",
+               fs: float = 1.0) -> Filter:
     """The filter of linear phase with the least weighted deviation from what is desired in bands.
 
     After McClellan, Parks and Rabiner, "A computer program for designing optimum FIR linear phase digital
@@ -792,11 +818,12 @@ def equiripple(taps, bands, desired, weight=None, kind="symmetric", fs=1.0):
     best = int(np.argmax(np.abs(gains)))
     made = Filter(h, EMPTY, False, fs, f"equiripple {kind}, fs {fs:g}",
                   (edges[2 * best] + edges[2 * best + 1]) / 2 / fs)
-    made.ripple = ripple
+    made.ripple = float(ripple)
     return made
 
 
-def narrow(edges, kind="lowpass", ripple=0.1, attenuation=60.0, fs=1.0):
+def narrow(edges: ArrayLike, kind: Literal["lowpass", "highpass", "bandpass", "bandstop"] = "lowpass",
+           ripple: float = 0.1, attenuation: float = 60.0, fs: float = 1.0) -> Filter:
     """A filter of linear phase for a narrow band, designed in two stages: a filter with zeros between
     its taps, and one that takes away its images.
 
@@ -834,15 +861,15 @@ def narrow(edges, kind="lowpass", ripple=0.1, attenuation=60.0, fs=1.0):
     """
     name = "filters.narrow"
     code = chosen(name, "kind", kind, KINDS)
-    edges = np.asarray(edges, float).ravel()
-    if len(edges) != (2 if code < 2 else 4):
-        refuse(name, "edges", f"a {kind} needs {2 if code < 2 else 4}; {len(edges)} came", "ErrSizesDisagree")
-    if np.any(np.diff(edges) <= 0) or edges[0] <= 0 or edges[-1] >= fs / 2:
+    corners = np.asarray(edges, float).ravel()
+    if len(corners) != (2 if code < 2 else 4):
+        refuse(name, "edges", f"a {kind} needs {2 if code < 2 else 4}; {len(corners)} came", "ErrSizesDisagree")
+    if np.any(np.diff(corners) <= 0) or corners[0] <= 0 or corners[-1] >= fs / 2:
         refuse(name, "edges", f"must rise between 0 and half the sampling rate, {fs / 2:g}", "ErrBadCutoff")
     if code < 2:
-        (fpass, fstop), centre = edges[::1 if code == 0 else -1], 0.0
+        (fpass, fstop), centre = corners[::1 if code == 0 else -1], 0.0
     else:
-        inner, outer, centre = edges[2] - edges[1], edges[3] - edges[0], edges.mean()
+        inner, outer, centre = corners[2] - corners[1], corners[3] - corners[0], corners.mean()
         fpass, fstop = (inner, outer) if code == 2 else (outer, inner)
     design = core.narrow(fs, float(fpass), float(fstop), float(centre), 10 ** (ripple / 20) - 1,
                          float(attenuation), code, {})
@@ -852,7 +879,7 @@ def narrow(edges, kind="lowpass", ripple=0.1, attenuation=60.0, fs=1.0):
                   main)
 
 
-def from_sos(sos, fs=1.0):
+def from_sos(sos: ArrayLike, fs: float = 1.0) -> Filter:
     """The filter of second-order sections, as other programs have them.
 
     Parameters
@@ -877,17 +904,17 @@ def from_sos(sos, fs=1.0):
     >>> qx.filters.from_sos([[0.5, 0.5, 0, 1, 0, 0]])([1.0, 1.0])
     array([0.5, 1. ])
     """
-    sos = np.asarray(sos, float)
-    if sos.ndim != 2 or sos.shape[1] != 6 or not len(sos):
-        refuse("filters.from_sos", "sos", f"rows of six are needed; shape {sos.shape} came",
+    rows = np.asarray(sos, float)
+    if rows.ndim != 2 or rows.shape[1] != 6 or not len(rows):
+        refuse("filters.from_sos", "sos", f"rows of six are needed; shape {rows.shape} came",
                "ErrCoefficientSizes")
-    if np.any(sos[:, 3] == 0):
+    if np.any(rows[:, 3] == 0):
         refuse("filters.from_sos", "sos", "a0 must not be 0", "ErrBadCoefficients")
-    sos = sos / sos[:, 3:4]
-    return Filter(sos[:, :3].ravel(), sos[:, 4:].ravel(), True, fs)
+    rows = rows / rows[:, 3:4]
+    return Filter(rows[:, :3].ravel(), rows[:, 4:].ravel(), True, fs)
 
 
-def from_ba(b, a=(1.0,), fs=1.0):
+def from_ba(b: ArrayLike, a: ArrayLike = (1.0,), fs: float = 1.0) -> Filter:
     """The filter of a numerator and a denominator, in direct form; without the latter the taps of one
     without feedback.
 
@@ -924,7 +951,8 @@ def from_ba(b, a=(1.0,), fs=1.0):
 
 # Smoothing
 
-def savgol(x, window_length, polyorder, deriv=0, delta=1.0, axis=LAST):
+def savgol(x: ArrayLike, window_length: int, polyorder: int, deriv: int = 0, delta: float = 1.0,
+           axis: int = LAST) -> Any:
     """Smoothing by the least-squares polynomial of the values around each (Savitzky-Golay), or a
     derivative of it. At the ends the polynomial of the first and last values goes on.
 
@@ -984,7 +1012,7 @@ def savgol(x, window_length, polyorder, deriv=0, delta=1.0, axis=LAST):
     return along(lambda channel: _derivative(channel, rows, deriv) / delta**deriv, x, axis)
 
 
-def _derivative(x, rows, deriv):
+def _derivative(x: Any, rows: Any, deriv: Any) -> Any:
     """Row i of rows is the coefficient of t^i of the polynomial around the centre of a frame."""
     frame, half = rows.shape[1], rows.shape[1] // 2
     weights = math.factorial(deriv) * rows[deriv]
@@ -994,7 +1022,8 @@ def _derivative(x, rows, deriv):
     return np.concatenate([ends[0][:half], inner, ends[1][half + 1:]])
 
 
-def median(x, size=3, ends="reflect", axis=LAST):
+def median(x: ArrayLike, size: int = 3, ends: Literal["reflect", "nearest", "zero"] = "reflect",
+           axis: int = LAST) -> Any:
     """The running median: of the `size` values around each.
 
     Parameters
@@ -1030,7 +1059,7 @@ def median(x, size=3, ends="reflect", axis=LAST):
                                                    "zero": "constant"})
     before, behind = size // 2, (size - 1) // 2
 
-    def of_channel(channel):
+    def of_channel(channel: Any) -> Any:
         if not len(channel):
             refuse("filters.median", "x", "is empty", "ErrEmptyInput")
         if mode == "constant" and len(channel) > behind:

@@ -9,11 +9,17 @@ Standard errors and bands take the scatter of the residuals; those of models tha
 parameters hold to first order.
 """
 
+from __future__ import annotations
+
+import dataclasses
 import functools
 import inspect
 import math
+from collections.abc import Callable, Iterator, Sequence
+from typing import Any, Literal
 
 import numpy as np
+from numpy.typing import ArrayLike, NDArray
 
 from .outcomes import QxWarning, warn
 from .topical import Result, chosen, refuse, result, served, vector, whole_number
@@ -55,31 +61,36 @@ class Fit(Result):
     """
 
     formula: str
-    parameters: dict
-    errors: dict
-    covariance: np.ndarray
+    parameters: dict[str, float]
+    errors: dict[str, float]
+    covariance: NDArray[Any]
     r_square: float
     rmse: float
     dof: int
-    residuals: np.ndarray
-    values: np.ndarray
+    residuals: NDArray[Any]
+    values: NDArray[Any]
+    # What it was made from.
+    _model: _Model = dataclasses.field(init=False, repr=False)
+    _x: NDArray[Any] = dataclasses.field(init=False, repr=False)
+    _w: NDArray[Any] = dataclasses.field(init=False, repr=False)
+    _fixed: NDArray[Any] = dataclasses.field(init=False, repr=False)
 
-    def __iter__(self):
+    def __iter__(self) -> Iterator[Any]:
         return iter((np.array([*self.parameters.values()]), self.covariance))
 
-    def __len__(self):
+    def __len__(self) -> int:
         return 2
 
-    def __getitem__(self, name):
+    def __getitem__(self, name: Any) -> Any:
         return self.parameters[name]
 
-    def _shown(self):
+    def _shown(self) -> Any:
         rows = [("formula", self.formula)]
         rows += [(name, f"{value:.6g} +- {self.errors[name]:.2g}") for name, value in self.parameters.items()]
         return rows + [("r_square", f"{self.r_square:.6g}"), ("rmse", f"{self.rmse:.6g}"),
                        ("dof", str(self.dof))]
 
-    def predict(self, x):
+    def predict(self, x: ArrayLike) -> Any:
         """The model at x.
 
         Parameters
@@ -93,7 +104,7 @@ class Fit(Result):
         """
         return self._model.value(np.asarray(x, float), np.array([*self.parameters.values()]))[()]
 
-    def confidence(self, x=None, level=0.95):
+    def confidence(self, x: ArrayLike | None = None, level: float = 0.95) -> tuple[Any, Any]:
         """Bounds of the curve at each x by itself.
 
         Parameters
@@ -110,11 +121,11 @@ class Fit(Result):
         """
         return self._band(core.Fit_confidence, x, level)
 
-    def prediction(self, x=None, level=0.95):
+    def prediction(self, x: Any = None, level: Any = 0.95) -> Any:
         """Bounds of one more observation of weight 1 at each x; arguments and results as of `confidence`."""
         return self._band(core.Fit_prediction, x, level)
 
-    def intervals(self, level=0.95):
+    def intervals(self, level: Any = 0.95) -> Any:
         """Confidence intervals of the parameters: lower and upper bound by their names; of fixed ones their
         value twice."""
         found = self._bounds(core.Fit_confidence, self._x[:0], level)
@@ -122,7 +133,7 @@ class Fit(Result):
         return {name: (float(value), float(value)) if is_fixed else tuple(map(float, next(free)))
                 for (name, value), is_fixed in zip(self.parameters.items(), self._fixed)}
 
-    def _bounds(self, bounds, x, level):
+    def _bounds(self, bounds: Any, x: Any, level: Any) -> Any:
         """The export's bounds of the model that is linearised at the parameters, at the samples and at x."""
         if not 0 < level < 1:
             refuse("fit.Fit", "level", f"must be between 0 and 1; {level} came", "ErrProbabilityOutOfRange")
@@ -135,7 +146,7 @@ class Fit(Result):
         found = bounds(np.ascontiguousarray(rows), observed, weights, p[free], float(level))
         return [*found[:-2], *(curve - linear for curve in found[-2:])]
 
-    def _band(self, bounds, x, level):
+    def _band(self, bounds: Any, x: Any, level: Any) -> Any:
         at = self._x if x is None else np.asarray(x, float)
         shape = at.shape[:1 - self._x.ndim or None]  # without that of a row
         new = at.reshape(-1, *self._x.shape[1:]) if x is not None else self._x[:0]
@@ -145,7 +156,7 @@ class Fit(Result):
         middle = self.predict(at)
         return middle + lower[()], middle + upper[()]
 
-    def plot(self, axes=None, level=0.95):
+    def plot(self, axes: Any = None, level: float = 0.95) -> Any:
         """Draws samples, model and the bounds of the curve with matplotlib.
 
         Parameters
@@ -173,14 +184,16 @@ class Fit(Result):
 class _Model:
     """A formula, the names of its parameters, its values, and its derivatives by them in columns."""
 
-    def __init__(self, formula, names, value, jacobian=None):
+    made_by: tuple[Any, ...]  # how it is pickled
+
+    def __init__(self, formula: Any, names: Any, value: Any, jacobian: Any = None) -> None:
         self.formula, self.names, self.value = formula, list(names), value
         self.jacobian = jacobian or self._differences
 
-    def __reduce__(self):
+    def __reduce__(self) -> Any:
         return self.made_by
 
-    def _differences(self, x, p):
+    def _differences(self, x: Any, p: Any) -> Any:
         columns = []
         for j, one in enumerate(p):
             step = np.cbrt(np.finfo(float).eps) * (abs(one) or 1.0)
@@ -190,17 +203,17 @@ class _Model:
         return np.stack(columns, -1)
 
 
-def _maker(build):
+def _maker(build: Any) -> Any:
     """A maker of models, which are pickled by its name and arguments."""
     @functools.wraps(build)
-    def make(*arguments):
+    def make(*arguments: Any) -> Any:
         model = build(*arguments)
         model.made_by = make, arguments
         return model
     return make
 
 
-def _or_without(offset, formula, names, value, columns):
+def _or_without(offset: Any, formula: Any, names: Any, value: Any, columns: Any) -> Any:
     """The model with or without its constant c."""
     if offset:
         return _Model(formula + " + c", [*names, "c"], lambda x, p: value(x, p) + p[-1],
@@ -209,12 +222,12 @@ def _or_without(offset, formula, names, value, columns):
 
 
 @_maker
-def _line():
+def _line() -> Any:
     return _Model("a x + b", "ab", lambda x, p: p[0] * x + p[1], lambda x, p: np.stack([x, np.ones(len(x))], -1))
 
 
 @_maker
-def _polynomial(degree):
+def _polynomial(degree: Any) -> Any:
     terms = ["c0", "c1 x", *(f"c{j} x^{j}" for j in range(2, degree + 1))]
     formula = " + ".join(terms[:degree + 1] if degree < 5 else [*terms[:3], "...", terms[degree]])
     return _Model(formula, [f"c{j}" for j in range(degree + 1)],
@@ -222,26 +235,26 @@ def _polynomial(degree):
 
 
 @_maker
-def _exponential(offset):
+def _exponential(offset: Any) -> Any:
     return _or_without(offset, "a exp(b x)", ["a", "b"], lambda x, p: p[0] * np.exp(p[1] * x),
                        lambda x, p: [np.exp(p[1] * x), p[0] * x * np.exp(p[1] * x)])
 
 
 @_maker
-def _power(offset):
+def _power(offset: Any) -> Any:
     return _or_without(offset, "a x^b", ["a", "b"], lambda x, p: p[0] * x**p[1],
                        lambda x, p: [x**p[1], p[0] * x**p[1] * np.log(x)])
 
 
 @_maker
-def _logarithm():
+def _logarithm() -> Any:
     return _Model("a ln(b x)", "ab", lambda x, p: p[0] * np.log(p[1] * x),
                   lambda x, p: np.stack([np.log(p[1] * x), np.full(len(x), p[0] / p[1])], -1))
 
 
 @_maker
-def _gaussian(offset):
-    def bell(x, p):
+def _gaussian(offset: Any) -> Any:
+    def bell(x: Any, p: Any) -> Any:
         return np.exp(-0.5 * ((x - p[1]) / p[2])**2)
 
     return _or_without(offset, "a exp(-((x - m) / s)^2 / 2)", ["a", "m", "s"], lambda x, p: p[0] * bell(x, p),
@@ -250,18 +263,18 @@ def _gaussian(offset):
 
 
 @_maker
-def _rows(names):
+def _rows(names: Any) -> Any:
     """y = H c, whose x are rows."""
     return _Model("H c", names, lambda H, p: np.asarray(H, float) @ p, lambda H, p: np.asarray(H, float))
 
 
 @_maker
-def _any(f, names):
+def _any(f: Any, names: Any) -> Any:
     return _Model(f"{getattr(f, '__name__', 'f')}(x, {', '.join(names)})", names,
                   lambda x, p: np.asarray(f(x, *p), float) + np.zeros(np.shape(x)))
 
 
-def _samples(function, x, y, sigma):
+def _samples(function: Any, x: Any, y: Any, sigma: Any) -> tuple[NDArray[Any], NDArray[Any], NDArray[Any]]:
     """x, y and weights 1 / sigma^2, or none."""
     x, y = (vector(one, f"fit.{function}", name).astype(float) for one, name in ((x, "x"), (y, "y")))
     if len(x) != len(y):
@@ -275,7 +288,7 @@ def _samples(function, x, y, sigma):
     return x, y, 1 / sigma**2
 
 
-def _finished(model, x, y, w, p, fixed=None, absolute=False):
+def _finished(model: Any, x: Any, y: Any, w: Any, p: Any, fixed: Any = None, absolute: Any = False) -> Any:
     """The Fit of parameters that were found."""
     p = np.array([float(one) for one in p])
     fixed = np.zeros(len(p), bool) if fixed is None else np.asarray(fixed, bool)
@@ -303,7 +316,7 @@ def _finished(model, x, y, w, p, fixed=None, absolute=False):
     return found
 
 
-def _limits(function, names, bounds, guess, fixed):
+def _limits(function: Any, names: Any, bounds: Any, guess: Any, fixed: Any) -> Any:
     """Lower and upper bounds and start values in the order of the names."""
     bounds = {**(bounds or {}), **{name: (value, value) for name, value in fixed.items()}}
     for name in {*bounds, *(guess or {})} - set(names) - set(fixed):
@@ -321,7 +334,8 @@ def _limits(function, names, bounds, guess, fixed):
     return lower, upper, start
 
 
-def _bounded(function, run, model, x, y, w, bounds, guess, method, fixed):
+def _bounded(function: Any, run: Any, model: Any, x: Any, y: Any, w: Any, bounds: Any, guess: Any, method: Any,
+             fixed: Any) -> Any:
     """A fit by an export that knows bounds, start values and methods."""
     code = chosen(f"fit.{function}", "method", method, METHODS)
     lower, upper, start = _limits(function, model.names, bounds, guess, fixed)
@@ -330,7 +344,8 @@ def _bounded(function, run, model, x, y, w, bounds, guess, method, fixed):
                      [low == high for low, high in zip(lower, upper)][:len(model.names)])
 
 
-def line(x, y, sigma=None, bounds=None, method="least squares"):
+def line(x: ArrayLike, y: ArrayLike, sigma: ArrayLike | None = None, bounds: dict[str, Any] | None = None,
+         method: Literal["least squares", "absolute", "bisquare"] = "least squares") -> Fit:
     """A line y = a x + b.
 
     Parameters
@@ -372,7 +387,7 @@ def line(x, y, sigma=None, bounds=None, method="least squares"):
     """
     x, y, w = _samples("line", x, y, sigma)
 
-    def run(y, x, w, start, lower, upper, code):
+    def run(y: Any, x: Any, w: Any, start: Any, lower: Any, upper: Any, code: Any) -> Any:
         if code == 0:
             return core.line(y, x, w, lower, upper)[1:3]
         export = core.line_absolute if code == 1 else core.line_bisquare
@@ -381,7 +396,8 @@ def line(x, y, sigma=None, bounds=None, method="least squares"):
     return _bounded("line", run, _line(), x, y, w, bounds, None, method, {})
 
 
-def polynomial(x, y, degree, sigma=None, fixed=None):
+def polynomial(x: ArrayLike, y: ArrayLike, degree: int, sigma: ArrayLike | None = None,
+               fixed: dict[str, Any] | None = None) -> Fit:
     """A polynomial c0 + c1 x + c2 x^2 + ...
 
     Parameters
@@ -425,7 +441,9 @@ def polynomial(x, y, degree, sigma=None, fixed=None):
     return _finished(_polynomial(degree), x, y, w, p, [name in given for name in names])
 
 
-def exponential(x, y, sigma=None, offset=True, bounds=None, guess=None, method="least squares"):
+def exponential(x: ArrayLike, y: ArrayLike, sigma: ArrayLike | None = None, offset: bool = True,
+                bounds: dict[str, Any] | None = None, guess: dict[str, Any] | None = None,
+                method: Literal["least squares", "absolute", "bisquare"] = "least squares") -> Fit:
     """An exponential y = a exp(b x) + c.
 
     Parameters
@@ -470,7 +488,9 @@ def exponential(x, y, sigma=None, offset=True, bounds=None, guess=None, method="
         bounds, guess, method, {} if offset else {"c": 0.0})
 
 
-def power(x, y, sigma=None, offset=True, bounds=None, guess=None, method="least squares"):
+def power(x: ArrayLike, y: ArrayLike, sigma: ArrayLike | None = None, offset: bool = True,
+          bounds: dict[str, Any] | None = None, guess: dict[str, Any] | None = None,
+          method: Literal["least squares", "absolute", "bisquare"] = "least squares") -> Fit:
     """A power y = a x^b + c of positive x.
 
     Parameters
@@ -517,7 +537,9 @@ def power(x, y, sigma=None, offset=True, bounds=None, guess=None, method="least 
         bounds, guess, method, {} if offset else {"c": 0.0})
 
 
-def logarithm(x, y, sigma=None, bounds=None, guess=None, method="least squares"):
+def logarithm(x: ArrayLike, y: ArrayLike, sigma: ArrayLike | None = None, bounds: dict[str, Any] | None = None,
+              guess: dict[str, Any] | None = None,
+              method: Literal["least squares", "absolute", "bisquare"] = "least squares") -> Fit:
     """A logarithm y = a ln(b x) of positive x.
 
     Parameters
@@ -562,7 +584,9 @@ def logarithm(x, y, sigma=None, bounds=None, guess=None, method="least squares")
         method, {})
 
 
-def gaussian(x, y, sigma=None, offset=True, bounds=None, guess=None, method="least squares"):
+def gaussian(x: ArrayLike, y: ArrayLike, sigma: ArrayLike | None = None, offset: bool = True,
+             bounds: dict[str, Any] | None = None, guess: dict[str, Any] | None = None,
+             method: Literal["least squares", "absolute", "bisquare"] = "least squares") -> Fit:
     """A peak or dip y = a exp(-((x - m) / s)^2 / 2) + c.
 
     Parameters
@@ -608,7 +632,8 @@ def gaussian(x, y, sigma=None, offset=True, bounds=None, guess=None, method="lea
         bounds, guess, method, {} if offset else {"c": 0.0})
 
 
-def linear(H, y, sigma=None, names=None):
+def linear(H: ArrayLike, y: ArrayLike, sigma: ArrayLike | None = None,
+           names: Sequence[str] | None = None) -> Fit:
     """A model that is linear in its parameters, y = H c.
 
     Parameters
@@ -652,7 +677,9 @@ def linear(H, y, sigma=None, names=None):
     return _finished(_rows(tuple(names)), H, y, w, p)
 
 
-def curve(f, x, y, guess, sigma=None, bounds=None, absolute_sigma=False):
+def curve(f: Callable[..., Any], x: ArrayLike, y: ArrayLike, guess: dict[str, Any] | Sequence[Any],
+          sigma: ArrayLike | None = None, bounds: dict[str, Any] | None = None,
+          absolute_sigma: bool = False) -> Fit:
     """Any model, by Levenberg-Marquardt steps with derivatives from differences (D. W. Marquardt, "An
     algorithm for least-squares estimation of nonlinear parameters", 1963).
 
@@ -707,9 +734,9 @@ def curve(f, x, y, guess, sigma=None, bounds=None, absolute_sigma=False):
     return _finished(model, x, y, w, p, lower == upper, absolute_sigma)
 
 
-def _marquardt(model, x, y, w, p, lower, upper):
+def _marquardt(model: Any, x: Any, y: Any, w: Any, p: Any, lower: Any, upper: Any) -> Any:
     """The parameters with the least weighted squares between the bounds."""
-    def cost_of(p):
+    def cost_of(p: Any) -> Any:
         residuals = y - model.value(x, p)
         return residuals, float(np.sum(residuals**2 if not len(w) else w * residuals**2))
 
@@ -789,17 +816,18 @@ class SmoothingSpline:
     True
     """
 
-    def __init__(self, x, y, sigma=None, smoothing=None, residual=None):
+    def __init__(self, x: ArrayLike, y: ArrayLike, sigma: ArrayLike | None = None,
+                 smoothing: float | None = None, residual: float | None = None) -> None:
         if smoothing is not None and residual is not None:
             refuse("fit.SmoothingSpline", "smoothing, residual", "one of both is given")
         x, y, w = _samples("SmoothingSpline", x, y, sigma)
         method, parameter = (1, float(smoothing)) if smoothing is not None else \
             (2, float(residual)) if residual is not None else (0, 0.0)
-        self.x = x
+        self.x: NDArray[Any] = x
         self.values, self.coefficients, _, self.smoothing, self.effective_parameters = core.SmoothingSpline(
             x, y, 1 / np.sqrt(w) if len(w) else EMPTY, method, parameter)
 
-    def __call__(self, xi, derivative=0):
+    def __call__(self, xi: Any, derivative: Any = 0) -> Any:
         """The spline, or a derivative from 0 to 3, at xi; beyond the samples it is a line."""
         xi = np.asarray(xi, float)
         if len(self.x) == 1:
@@ -814,7 +842,7 @@ class SmoothingSpline:
                  np.where(is_beyond, 0, 6 * c3))
         return found[derivative][()]
 
-    def __repr__(self):
+    def __repr__(self) -> str:
         return (f"SmoothingSpline: {len(self.x)} samples, lambda {self.smoothing:.6g}, "
                 f"{self.effective_parameters:.4g} effective parameters")
 
@@ -856,7 +884,8 @@ class BSpline:
     0.125
     """
 
-    def __init__(self, x, y, knots=4, degree=3, sigma=None):
+    def __init__(self, x: ArrayLike, y: ArrayLike, knots: ArrayLike = 4, degree: int = 3,
+                 sigma: ArrayLike | None = None) -> None:
         x, y, w = _samples("BSpline", x, y, sigma)
         interior, places = (whole_number("fit.BSpline", "knots", knots, 0, "ErrNegativeCount"), EMPTY) \
             if np.ndim(knots) == 0 else (0, vector(knots, "fit.BSpline", "knots"))
@@ -864,7 +893,7 @@ class BSpline:
         self.knots, self.coefficients, self.values, self.mse = core.BSpline(
             x, y, w, self.degree, interior, places)
 
-    def __call__(self, xi):
+    def __call__(self, xi: Any) -> Any:
         """The spline at xi, by de Boor's recurrence; beyond the samples the end pieces go on."""
         xi = np.asarray(xi, float)
         k, t = self.degree, self.knots
@@ -877,5 +906,5 @@ class BSpline:
                 d[j] = (1 - a) * d[j - 1] + a * d[j]
         return d[k][()]
 
-    def __repr__(self):
+    def __repr__(self) -> str:
         return f"BSpline: degree {self.degree}, {len(self.coefficients)} coefficients, mse {self.mse:.6g}"

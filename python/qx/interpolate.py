@@ -1,6 +1,11 @@
 """Values between the points of a table."""
 
+from __future__ import annotations
+
+from typing import Any
+
 import numpy as np
+from numpy.typing import ArrayLike, NDArray
 
 from .topical import Result, refuse, result, served, vector
 
@@ -9,7 +14,7 @@ __all__ = ["CubicSpline", "Interpolated", "linear", "polynomial", "rational"]
 core = served("interpolate")
 
 
-def _table(function, x, y):
+def _table(function: str, x: ArrayLike, y: ArrayLike) -> tuple[NDArray[Any], NDArray[Any]]:
     x, y = (vector(one, f"interpolate.{function}", name).astype(float) for one, name in ((x, "x"), (y, "y")))
     if len(x) != len(y) or not len(x):
         refuse(f"interpolate.{function}", "x, y", f"must be of one length, and not empty; {len(x)} and {len(y)} "
@@ -29,8 +34,8 @@ class Interpolated(Result):
         Estimates of their errors, the last corrections.
     """
 
-    values: np.ndarray
-    errors: np.ndarray
+    values: NDArray[Any]
+    errors: NDArray[Any]
 
 
 class CubicSpline:
@@ -61,7 +66,8 @@ class CubicSpline:
     (array([0.25, 2.25]), 2.0)
     """
 
-    def __init__(self, x, y, start=None, end=None):
+    def __init__(self, x: ArrayLike, y: ArrayLike, start: float | None = None,
+                 end: float | None = None) -> None:
         self.x, self.y = _table("CubicSpline", x, y)
         if np.any(np.diff(self.x) <= 0):
             refuse("interpolate.CubicSpline", "x", "must rise", "ErrAbscissaeOrder")
@@ -69,7 +75,7 @@ class CubicSpline:
         self.second_derivatives = core.CubicSpline(self.y, self.x, natural if start is None else float(start),
                                                    natural if end is None else float(end))
 
-    def __call__(self, xi, derivative=0):
+    def __call__(self, xi: ArrayLike, derivative: int = 0) -> Any:
         """Values of the spline, or of a derivative.
 
         Parameters
@@ -98,11 +104,11 @@ class CubicSpline:
                 (y1 - y0) / h + ((3 * b * b - 1) * m1 - (3 * a * a - 1) * m0) * (h / 6),
                 a * m0 + b * m1, (m1 - m0) / h)[derivative][()]
 
-    def __repr__(self):
+    def __repr__(self) -> str:
         return f"CubicSpline: {len(self.x)} points from {self.x[0]:g} to {self.x[-1]:g}"
 
 
-def _each(run, xi):
+def _each(run: Any, xi: Any) -> Any:
     xi = np.asarray(xi, float)
     found = [run(one) for one in xi.ravel().tolist()]
     values, errors = (np.array(part).reshape(xi.shape)[()] for part in zip(*found)) if found else \
@@ -110,7 +116,7 @@ def _each(run, xi):
     return Interpolated(values, errors)
 
 
-def linear(xi, x, y):
+def linear(xi: ArrayLike, x: ArrayLike, y: ArrayLike) -> Any:
     """Straight lines between the points of a table; beyond it the first and the last value.
 
     Parameters
@@ -138,10 +144,10 @@ def linear(xi, x, y):
     x, y = _table("linear", x, y)
     if np.any(np.diff(x) <= 0):
         refuse("interpolate.linear", "x", "must rise", "ErrAbscissaeOrder")
-    return np.interp(xi, x, y)
+    return np.interp(np.asarray(xi, float), x, y)[()]
 
 
-def polynomial(xi, x, y):
+def polynomial(xi: ArrayLike, x: ArrayLike, y: ArrayLike) -> Interpolated:
     """The polynomial through all points of a table (E. H. Neville, "Iterative interpolation", 1934).
 
     Parameters
@@ -170,7 +176,7 @@ def polynomial(xi, x, y):
     return _each(lambda one: core.polynomial(y, x, one), xi)
 
 
-def rational(xi, x, y):
+def rational(xi: ArrayLike, x: ArrayLike, y: ArrayLike) -> Interpolated:
     """The rational function through all points of a table (R. Bulirsch and J. Stoer, 1964).
 
     Parameters

@@ -6,9 +6,13 @@ may be stacked: what has more than two dimensions is taken matrix by matrix, in 
 is a `numpy.linalg.LinAlgError`; a system that leaves few digits is a warning.
 """
 
+from __future__ import annotations
+
 import math
+from typing import Any, Literal
 
 import numpy as np
+from numpy.typing import ArrayLike, NDArray
 
 from .outcomes import QxWarning, keeping, warn
 from .topical import Result, chosen, refuse, result, served, whole_number
@@ -45,10 +49,10 @@ class LeastSquares(Result):
         Of the matrix, falling.
     """
 
-    x: np.ndarray
-    residuals: np.ndarray
+    x: NDArray[Any]
+    residuals: NDArray[Any]
     rank: int
-    singular_values: np.ndarray
+    singular_values: NDArray[Any]
 
 
 @result
@@ -63,8 +67,8 @@ class Eigen(Result):
         The eigenvectors in the columns.
     """
 
-    values: np.ndarray
-    vectors: np.ndarray
+    values: NDArray[Any]
+    vectors: NDArray[Any]
 
 
 @result
@@ -81,9 +85,9 @@ class SVD(Result):
         The right singular vectors, conjugated, in the rows.
     """
 
-    u: np.ndarray
-    s: np.ndarray
-    vh: np.ndarray
+    u: NDArray[Any]
+    s: NDArray[Any]
+    vh: NDArray[Any]
 
 
 @result
@@ -100,11 +104,11 @@ class QR(Result):
         The order of the columns where they were exchanged.
     """
 
-    q: np.ndarray
-    r: np.ndarray
-    permutation: "np.ndarray | None" = None
+    q: NDArray[Any]
+    r: NDArray[Any]
+    permutation: NDArray[Any] | None = None
 
-    def __iter__(self):
+    def __iter__(self) -> Any:
         return iter((self.q, self.r) if self.permutation is None else (self.q, self.r, self.permutation))
 
 
@@ -122,9 +126,9 @@ class LU(Result):
         An upper triangle.
     """
 
-    p: np.ndarray
-    l: np.ndarray  # noqa: E741
-    u: np.ndarray
+    p: NDArray[Any]
+    l: NDArray[Any]  # noqa: E741
+    u: NDArray[Any]
 
 
 @result
@@ -141,9 +145,9 @@ class Schur(Result):
         The eigenvalues in the order of the diagonal.
     """
 
-    t: np.ndarray
-    z: np.ndarray
-    values: np.ndarray
+    t: NDArray[Any]
+    z: NDArray[Any]
+    values: NDArray[Any]
     _unpacked = ("t", "z")
 
 
@@ -161,12 +165,12 @@ class QZ(Result):
         The eigenvalues are alpha / beta.
     """
 
-    s: np.ndarray
-    t: np.ndarray
-    q: np.ndarray
-    z: np.ndarray
-    alpha: np.ndarray
-    beta: np.ndarray
+    s: NDArray[Any]
+    t: NDArray[Any]
+    q: NDArray[Any]
+    z: NDArray[Any]
+    alpha: NDArray[Any]
+    beta: NDArray[Any]
     _unpacked = ("s", "t", "q", "z")
 
 
@@ -182,17 +186,17 @@ class Hessenberg(Result):
         Unitary.
     """
 
-    h: np.ndarray
-    q: np.ndarray
+    h: NDArray[Any]
+    q: NDArray[Any]
 
 
-def _served(name, *matrices):
+def _served(name: Any, *matrices: Any) -> Any:
     """The export for real or for complex matrices."""
     is_complex = any(matrix.dtype.kind == "c" for matrix in matrices)
     return getattr(core, name + "_complex" if is_complex else name)
 
 
-def _matrix(function, a, is_square=False, argument="a"):
+def _matrix(function: str, a: ArrayLike, is_square: bool = False, argument: str = "a") -> NDArray[Any]:
     a = as_array(a)
     if a.ndim < 2:
         refuse(function, argument, f"at least two dimensions are needed; {a.ndim} came", "ErrNotSquare")
@@ -203,7 +207,7 @@ def _matrix(function, a, is_square=False, argument="a"):
     return a
 
 
-def _each(function, *stacks):
+def _each(function: Any, *stacks: Any) -> Any:
     """The function of matrices over the stacks of them."""
     if all(stack.ndim == 2 for stack in stacks):
         return function(*stacks)
@@ -212,17 +216,17 @@ def _each(function, *stacks):
     rows = [*zip(*flat)]
     found = many(lambda row: function(*row), rows, sum(one.size for one in flat))
 
-    def stacked(parts):
+    def stacked(parts: Any) -> Any:
         parts = [np.asarray(part) for part in parts]
         return np.stack(parts).reshape(*shape, *parts[0].shape)
 
     if isinstance(found[0], Result):
-        fields = {name: [getattr(one, name) for one in found] for name in found[0].__dataclass_fields__}
+        fields = {name: [getattr(one, name) for one in found] for name in found[0].__dict__}
         return type(found[0])(*(None if parts[0] is None else stacked(parts) for parts in fields.values()))
     return stacked(found)
 
 
-def _near_one(a):
+def _near_one(a: Any) -> Any:
     """The matrix by the power of two next to its largest element, and that power. What is made of singular
     values loses digits for matrices of a norm far below 1."""
     largest = np.abs(a).max(initial=0)
@@ -232,7 +236,7 @@ def _near_one(a):
     return (a, 1.0) if not 0 < power < np.inf else (a / power, power)
 
 
-def _sides(function, a, b):
+def _sides(function: str, a: NDArray[Any], b: ArrayLike) -> tuple[NDArray[Any], bool]:
     """b as a matrix, and whether it was a vector."""
     b = as_array(b)
     is_vector = b.ndim == 1 or b.ndim == a.ndim - 1 and b.ndim > 1 and b.shape == a.shape[:-1]
@@ -243,7 +247,7 @@ def _sides(function, a, b):
     return columns, is_vector
 
 
-def _factors(function, a):
+def _factors(function: Any, a: Any) -> Any:
     """The LU factors and pivots of a matrix that is not singular."""
     (lu, pivots, _), kept = keeping(_served("lu", a), a)
     if kept or not np.all(np.diagonal(lu)):
@@ -251,12 +255,12 @@ def _factors(function, a):
     return lu, pivots
 
 
-def _solved(lu, pivots, columns):
+def _solved(lu: Any, pivots: Any, columns: Any) -> Any:
     solve_one = _served("solve", lu, columns)
     return np.stack([solve_one(lu, pivots, column) for column in columns.T], -1)
 
 
-def _inverse_norm(lu, pivots):
+def _inverse_norm(lu: Any, pivots: Any) -> Any:
     """The largest column sum of moduli of the inverse: exact for small matrices, else an estimate from
     below (W. W. Hager, "Condition estimates", 1984)."""
     n = len(lu)
@@ -267,7 +271,7 @@ def _inverse_norm(lu, pivots):
     for step, pivot in enumerate(pivots):
         order[[step, pivot]] = order[[pivot, step]]
 
-    def transposed(v):
+    def transposed(v: Any) -> Any:
         y = np.conj(_served("solve_triangular", lu)(np.ascontiguousarray(upper.T), 0, np.conj(v)[:, None]))
         y = np.conj(_served("solve_triangular", lu)(np.ascontiguousarray(lower.T), 1, np.conj(y)))[:, 0]
         found = np.empty_like(y)
@@ -287,14 +291,14 @@ def _inverse_norm(lu, pivots):
     return best
 
 
-def _warn_of(function, condition):
+def _warn_of(function: Any, condition: Any) -> None:
     if not condition < WORST:
         digits = max(0, math.floor(-math.log10(EPS * condition))) if condition < np.inf else 0
         warn(QxWarning(f"qx.{function}", 20006, f"qx.{function}: a is badly conditioned, {condition:.1e}: of the "
                        f"result about {digits} digits are certain"))
 
 
-def _condition(a, lu, pivots):
+def _condition(a: Any, lu: Any, pivots: Any) -> Any:
     try:
         return float(np.abs(a).sum(0).max() * _inverse_norm(lu, pivots))
     except np.linalg.LinAlgError:
@@ -304,7 +308,8 @@ def _condition(a, lu, pivots):
 ASSUMPTIONS = {"general": "general", "positive": "positive", "lower": "lower", "upper": "upper"}
 
 
-def solve(a, b, assume="general"):
+def solve(a: ArrayLike, b: ArrayLike,
+          assume: Literal["general", "positive", "lower", "upper"] = "general") -> NDArray[Any]:
     """The solution x of a x = b.
 
     By LU factorisation with row exchanges. Where the condition number leaves fewer than four digits, a
@@ -342,7 +347,7 @@ def solve(a, b, assume="general"):
     a = _matrix("linalg.solve", a, True)
     columns, is_vector = _sides("linalg.solve", a, b)
 
-    def of_one(a, columns):
+    def of_one(a: Any, columns: Any) -> Any:
         if kind in ("lower", "upper"):
             return _served("solve_triangular", a, columns)(a, int(kind == "upper"), columns)
         if kind == "positive":
@@ -357,7 +362,7 @@ def solve(a, b, assume="general"):
     return found[..., 0] if is_vector else found
 
 
-def lstsq(a, b, rcond=None):
+def lstsq(a: ArrayLike, b: ArrayLike, rcond: float | None = None) -> LeastSquares:
     """The x with the least sum of squares of a x - b, the smallest of them where there are several; by
     singular values.
 
@@ -398,7 +403,7 @@ def lstsq(a, b, rcond=None):
     return LeastSquares(x[:, 0] if is_vector else x, left, rank, values)
 
 
-def inv(a):
+def inv(a: ArrayLike) -> NDArray[Any]:
     """The inverse of a square matrix, by LU factorisation.
 
     Parameters
@@ -424,7 +429,7 @@ def inv(a):
     """
     a = _matrix("linalg.inv", a, True)
 
-    def of_one(a):
+    def of_one(a: Any) -> Any:
         lu, pivots = _factors("linalg.inv", a)
         found = _served("solve_inverse", a)(lu, pivots)
         _warn_of("linalg.inv", np.abs(a).sum(0).max() * np.abs(found).sum(0).max())
@@ -433,7 +438,7 @@ def inv(a):
     return _each(of_one, a)
 
 
-def pinv(a, rcond=None):
+def pinv(a: ArrayLike, rcond: float | None = None) -> NDArray[Any]:
     """The pseudo-inverse (E. H. Moore, R. Penrose), by singular values.
 
     Parameters
@@ -458,7 +463,7 @@ def pinv(a, rcond=None):
     >>> qx.linalg.pinv([[1.0], [1.0]]).round(12)
     array([[0.5, 0.5]])
     """
-    def of_one(a):
+    def of_one(a: Any) -> Any:
         scaled, power = _near_one(a)
         largest = _served("svdvals", a)(scaled).max()
         limit = (max(a.shape) * EPS if rcond is None else rcond) * largest
@@ -467,7 +472,7 @@ def pinv(a, rcond=None):
     return _each(of_one, _matrix("linalg.pinv", a))
 
 
-def det(a):
+def det(a: ArrayLike) -> complex:
     """The determinant of a square matrix.
 
     Parameters
@@ -495,7 +500,7 @@ def det(a):
     return _each(lambda a: _served("det", a)(a, 0), _matrix("linalg.det", a, True))
 
 
-def trace(a):
+def trace(a: ArrayLike) -> complex:
     """The sum of the diagonal of a square matrix.
 
     Parameters
@@ -527,7 +532,7 @@ NORMS = {"spectral": 0, 2: 0, 1: 1, "fro": 2, "frobenius": 2, math.inf: 3}
 CONDITIONS = {None: 0, 2: 0, 1: 1, "fro": 2, "frobenius": 2, math.inf: 3}
 
 
-def norm(a, ord=None):
+def norm(a: ArrayLike, ord: int | float | str | None = None) -> float:
     """The norm of a vector or a matrix.
 
     Parameters
@@ -564,7 +569,7 @@ def norm(a, ord=None):
     return _served("norm", a)(scaled, kind) * power
 
 
-def cond(a, p=None):
+def cond(a: ArrayLike, p: float | Literal["fro"] | None = None) -> float:
     """The condition number: by how much relative errors of the right side of a system may grow.
 
     Parameters
@@ -595,7 +600,7 @@ def cond(a, p=None):
     return _each(lambda a: _served("cond", a)(_near_one(a)[0], kind), _matrix("linalg.cond", a, kind > 0))
 
 
-def matrix_rank(a, rcond=None):
+def matrix_rank(a: ArrayLike, rcond: float | None = None) -> int:
     """The number of singular values above rcond times the largest one.
 
     Parameters
@@ -620,7 +625,7 @@ def matrix_rank(a, rcond=None):
     >>> qx.linalg.matrix_rank([[1.0, 2.0], [2.0, 4.0]])
     1
     """
-    def of_one(a):
+    def of_one(a: Any) -> Any:
         scaled, _ = _near_one(a)
         limit = (max(a.shape) * EPS if rcond is None else rcond) * _served("svdvals", a)(scaled).max()
         return _served("matrix_rank", a)(scaled, float(limit))
@@ -628,7 +633,7 @@ def matrix_rank(a, rcond=None):
     return _each(of_one, _matrix("linalg.matrix_rank", a))
 
 
-def eig(a, b=None):
+def eig(a: ArrayLike, b: ArrayLike | None = None) -> Eigen:
     """Eigenvalues and eigenvectors of unit length of a square matrix; with b those of a v = value b v.
 
     Parameters
@@ -662,7 +667,7 @@ def eig(a, b=None):
     return _each(lambda a, b: Eigen(*_served("eig_general", a, b)(a, b, 1)), a, b)
 
 
-def eigvals(a, b=None):
+def eigvals(a: ArrayLike, b: ArrayLike | None = None) -> NDArray[np.complex128]:
     """The eigenvalues of `eig`, without the vectors.
 
     Parameters
@@ -696,7 +701,7 @@ def eigvals(a, b=None):
     return _each(lambda a, b: _served("eig_general", a, b)(a, b, 0)[0], a, b)
 
 
-def eigh(a):
+def eigh(a: ArrayLike) -> Eigen:
     """Eigenvalues, ascending, and orthonormal eigenvectors of a symmetric or Hermitian matrix, read from
     its lower triangle.
 
@@ -722,7 +727,7 @@ def eigh(a):
     >>> qx.linalg.eigh([[2.0, 1.0], [1.0, 2.0]]).values.round(12)
     array([1., 3.])
     """
-    def of_one(a):
+    def of_one(a: Any) -> Any:
         if a.dtype.kind == "c":
             values, vectors = core.eig_complex(a, 1, 1)
             return Eigen(values.real, vectors)
@@ -732,7 +737,7 @@ def eigh(a):
     return _each(of_one, _matrix("linalg.eigh", a, True))
 
 
-def eigvalsh(a):
+def eigvalsh(a: ArrayLike) -> NDArray[np.float64]:
     """The eigenvalues of `eigh`, without the vectors.
 
     Parameters
@@ -761,7 +766,7 @@ def eigvalsh(a):
                  _matrix("linalg.eigvalsh", a, True))
 
 
-def svd(a, full_matrices=True):
+def svd(a: ArrayLike, full_matrices: bool = True) -> SVD:
     r"""The singular value decomposition.
 
     .. math:: a = u\, \mathrm{diag}(s)\, v^H
@@ -788,7 +793,7 @@ def svd(a, full_matrices=True):
     >>> qx.linalg.svd([[3.0, 0.0], [0.0, 4.0]]).s.round(12)
     array([4., 3.])
     """
-    def of_one(a):
+    def of_one(a: Any) -> Any:
         scaled, power = _near_one(a)
         u, s, v = _served("svd", a)(scaled, int(full_matrices))
         return SVD(u, s * power, v.conj().T)
@@ -796,7 +801,7 @@ def svd(a, full_matrices=True):
     return _each(of_one, _matrix("linalg.svd", a))
 
 
-def svdvals(a):
+def svdvals(a: ArrayLike) -> NDArray[np.float64]:
     """The singular values, falling.
 
     Parameters
@@ -819,14 +824,14 @@ def svdvals(a):
     >>> qx.linalg.svdvals([[3.0, 0.0], [0.0, 4.0]]).round(12)
     array([4., 3.])
     """
-    def of_one(a):
+    def of_one(a: Any) -> Any:
         scaled, power = _near_one(a)
         return _served("svdvals", a)(scaled) * power
 
     return _each(of_one, _matrix("linalg.svdvals", a))
 
 
-def qr(a, mode="reduced", pivoting=False):
+def qr(a: ArrayLike, mode: Literal["reduced", "complete"] = "reduced", pivoting: bool = False) -> QR:
     """The QR decomposition by Householder reflections.
 
     Parameters
@@ -857,14 +862,14 @@ def qr(a, mode="reduced", pivoting=False):
     """
     economy = chosen("linalg.qr", "mode", mode, {"reduced": 1, "complete": 0})
 
-    def of_one(a):
+    def of_one(a: Any) -> Any:
         permutation, q, r = _served("qr", a)(a, int(pivoting), economy)
         return QR(q, r, np.argmax(np.abs(permutation), 0) if pivoting else None)
 
     return _each(of_one, _matrix("linalg.qr", a))
 
 
-def lu(a):
+def lu(a: ArrayLike) -> LU:
     """The LU decomposition with row exchanges, a = p l u; also of a singular matrix.
 
     Parameters
@@ -888,7 +893,7 @@ def lu(a):
     array([[3.      , 4.      ],
            [0.      , 0.666667]])
     """
-    def of_one(a):
+    def of_one(a: Any) -> Any:
         (packed, pivots, _), _ = keeping(_served("lu", a), a)
         m, n = a.shape
         k, order = min(m, n), np.arange(m)
@@ -901,7 +906,7 @@ def lu(a):
     return _each(of_one, _matrix("linalg.lu", a))
 
 
-def cholesky(a):
+def cholesky(a: ArrayLike) -> NDArray[Any]:
     """The lower triangle l with a = l l^H, of a symmetric (Hermitian) and positive definite matrix read
     from its lower triangle.
 
@@ -932,7 +937,8 @@ def cholesky(a):
 SORTS = {"none": 0, "ascending real": 1, "descending real": 2, "ascending": 3, "descending": 4}
 
 
-def schur(a, sort="none"):
+def schur(a: ArrayLike,
+          sort: Literal["none", "ascending real", "descending real", "ascending", "descending"] = "none") -> Schur:
     """The Schur form of a square matrix.
 
     Parameters
@@ -961,14 +967,15 @@ def schur(a, sort="none"):
     """
     order = chosen("linalg.schur", "sort", sort, SORTS)
 
-    def of_one(a):
+    def of_one(a: Any) -> Any:
         t, z, values = _served("schur", a)(a, 1, order)
         return Schur(t, z, values)
 
     return _each(of_one, _matrix("linalg.schur", a, True))
 
 
-def qz(a, b, sort="none"):
+def qz(a: ArrayLike, b: ArrayLike,
+       sort: Literal["none", "ascending real", "descending real", "ascending", "descending"] = "none") -> QZ:
     """The generalised Schur form of two square matrices.
 
     Parameters
@@ -998,14 +1005,14 @@ def qz(a, b, sort="none"):
     """
     order = chosen("linalg.qz", "sort", sort, SORTS)
 
-    def of_one(a, b):
+    def of_one(a: Any, b: Any) -> Any:
         s, t, q, z, alpha, beta = _served("qz", a, b)(a, b, 1, order)
         return QZ(s, t, q, z, alpha, beta)
 
     return _each(of_one, _matrix("linalg.qz", a, True), _matrix("linalg.qz", b, True, "b"))
 
 
-def hessenberg(a):
+def hessenberg(a: ArrayLike) -> Hessenberg:
     """The Hessenberg form of a square matrix.
 
     Parameters
@@ -1034,7 +1041,7 @@ def hessenberg(a):
     return _each(lambda a: Hessenberg(*_served("hessenberg", a)(a, 1, len(a))), _matrix("linalg.hessenberg", a, True))
 
 
-def expm(a):
+def expm(a: ArrayLike) -> NDArray[Any]:
     r"""The exponential of a square matrix.
 
     .. math:: e^A = \sum_k A^k / k!
@@ -1065,7 +1072,7 @@ def expm(a):
     return _each(lambda a: _served("expm", a)(a), _matrix("linalg.expm", a, True))
 
 
-def logm(a):
+def logm(a: ArrayLike) -> NDArray[Any]:
     """The principal logarithm of a square matrix.
 
     Parameters
@@ -1092,14 +1099,14 @@ def logm(a):
     array([[0., 1.],
            [0., 0.]])
     """
-    def of_one(a):
+    def of_one(a: Any) -> Any:
         found = _served("logm", a)(a)
         return found.real if found.dtype.kind == "c" and a.dtype.kind != "c" and not np.any(found.imag) else found
 
     return _each(of_one, _matrix("linalg.logm", a, True))
 
 
-def sqrtm(a):
+def sqrtm(a: ArrayLike) -> NDArray[Any]:
     """The principal square root of a square matrix.
 
     Parameters
@@ -1126,14 +1133,14 @@ def sqrtm(a):
     array([[2., 0.],
            [0., 3.]])
     """
-    def of_one(a):
+    def of_one(a: Any) -> Any:
         found = _served("sqrtm", a)(a)
         return found.real if a.dtype.kind != "c" and not np.any(found.imag) else found
 
     return _each(of_one, _matrix("linalg.sqrtm", a, True))
 
 
-def matrix_power(a, n):
+def matrix_power(a: ArrayLike, n: int) -> NDArray[Any]:
     """A whole power of a square matrix; a negative one is of the inverse.
 
     Parameters
@@ -1166,7 +1173,7 @@ def matrix_power(a, n):
     return _each(lambda a: _served("matrix_power", a)(a, n), a)
 
 
-def solve_sylvester(a, b, q):
+def solve_sylvester(a: ArrayLike, b: ArrayLike, q: ArrayLike) -> NDArray[Any]:
     """The solution x of a x + x b = q.
 
     Parameters
@@ -1200,7 +1207,7 @@ def solve_sylvester(a, b, q):
     return _served("solve_sylvester", a, b, q)(a, b, q, 0)
 
 
-def solve_lyapunov(a, q):
+def solve_lyapunov(a: ArrayLike, q: ArrayLike) -> NDArray[Any]:
     """The solution x of a x + x a^H = q (continuous time).
 
     Parameters
@@ -1229,7 +1236,7 @@ def solve_lyapunov(a, q):
     return _served("solve_lyapunov", a, q)(a, q, 0)
 
 
-def solve_discrete_lyapunov(a, q):
+def solve_discrete_lyapunov(a: ArrayLike, q: ArrayLike) -> NDArray[Any]:
     """The solution x of a x a^H - x + q = 0 (discrete time).
 
     Parameters
@@ -1259,7 +1266,7 @@ def solve_discrete_lyapunov(a, q):
     return _served("solve_lyapunov", a, q)(a, q, 1)
 
 
-def solve_banded(bands, ab, b):
+def solve_banded(bands: tuple[int, int], ab: ArrayLike, b: ArrayLike) -> NDArray[Any]:
     """The solution x of a x = b for a matrix with few diagonals.
 
     Parameters
@@ -1296,7 +1303,7 @@ def solve_banded(bands, ab, b):
     return _served("solve_banded_many", ab, b)(ab, b, below, above)
 
 
-def charpoly(a):
+def charpoly(a: ArrayLike) -> NDArray[Any]:
     """The coefficients of the characteristic polynomial det(t - a), the constant first.
 
     Parameters
@@ -1324,7 +1331,7 @@ def charpoly(a):
     return _each(lambda a: _served("charpoly", a)(a), _matrix("linalg.charpoly", a, True))
 
 
-def is_positive_definite(a):
+def is_positive_definite(a: ArrayLike) -> bool:
     """Whether a matrix is exactly symmetric (Hermitian) with eigenvalues that are all above 0.
 
     Parameters
@@ -1352,7 +1359,7 @@ def is_positive_definite(a):
     return bool(_served("is_positive_definite", _matrix("linalg.is_positive_definite", a, True))(as_array(a)))
 
 
-def is_symmetric(a, tolerance=0.0):
+def is_symmetric(a: ArrayLike, tolerance: float = 0.0) -> bool:
     """Whether a matrix is symmetric, a complex one Hermitian, within a tolerance.
 
     Parameters
@@ -1384,7 +1391,7 @@ def is_symmetric(a, tolerance=0.0):
     return bool(_served("is_symmetric", a)(a, float(tolerance), 0, *more))
 
 
-def balance(a):
+def balance(a: ArrayLike) -> tuple[NDArray[Any], NDArray[Any]]:
     """A square matrix balanced for the calculation of eigenvalues: rows and columns exchanged and
     multiplied by powers of two (B. N. Parlett and C. Reinsch, 1969).
 
@@ -1432,15 +1439,15 @@ class GSVD(Result):
         The rank of a and b together.
     """
 
-    alpha: np.ndarray
-    beta: np.ndarray
-    u: np.ndarray
-    v: np.ndarray
-    q: np.ndarray
+    alpha: NDArray[Any]
+    beta: NDArray[Any]
+    u: NDArray[Any]
+    v: NDArray[Any]
+    q: NDArray[Any]
     rank: int
 
 
-def gsvd(a, b):
+def gsvd(a: ArrayLike, b: ArrayLike) -> GSVD:
     """The generalised singular values of two matrices with as many columns.
 
     Parameters
@@ -1472,7 +1479,7 @@ def gsvd(a, b):
     return GSVD(alpha[:k + rank_b], beta[:k + rank_b], u, v, q, k + rank_b)
 
 
-def kron(a, b):
+def kron(a: ArrayLike, b: ArrayLike) -> NDArray[Any]:
     """The Kronecker product of two matrices.
 
     Parameters
@@ -1500,7 +1507,7 @@ def kron(a, b):
     return _served("kron", a, b)(a, b)
 
 
-def toeplitz(c, r=None):
+def toeplitz(c: ArrayLike, r: ArrayLike | None = None) -> NDArray[Any]:
     """The matrix whose diagonals are constant.
 
     Parameters
@@ -1532,7 +1539,7 @@ def toeplitz(c, r=None):
     return _served("toeplitz", c, r)(2, len(c), c, r)
 
 
-def companion(p):
+def companion(p: ArrayLike) -> NDArray[Any]:
     """The companion matrix of a polynomial, whose eigenvalues are its roots.
 
     Parameters

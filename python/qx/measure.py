@@ -5,14 +5,21 @@ Times and places are in seconds from the first sample where the sampling rate `f
 default 1.0 they are in samples.
 """
 
+from __future__ import annotations
+
 import math
+from typing import TYPE_CHECKING, Any, Literal
 
 import numpy as np
+from numpy.typing import ArrayLike, NDArray
 
 from . import measuring, windows
 from .outcomes import QxError
 from .topical import (LAST, Result, Stream, along, chosen, refuse, result, served, vector,
                       whole_number)
+
+if TYPE_CHECKING:
+    from . import filters
 
 __all__ = ["Bands", "Cycles", "Harmonics", "Levels", "PeakFinder", "Peaks", "Pulse", "Tone", "Tones",
            "Trigger", "Triggers", "Vertices", "band_frequencies", "cycles", "delay",
@@ -44,14 +51,14 @@ class Peaks(Result):
         The samples that are higher than their neighbours; of a plateau its middle.
     """
 
-    positions: np.ndarray
-    heights: np.ndarray
-    prominences: np.ndarray
-    widths: np.ndarray
-    indices: np.ndarray
+    positions: NDArray[Any]
+    heights: NDArray[Any]
+    prominences: NDArray[Any]
+    widths: NDArray[Any]
+    indices: NDArray[Any]
     _unpacked = ("positions", "heights")
 
-    def __len__(self):
+    def __len__(self) -> int:
         return len(self.positions)
 
 
@@ -86,9 +93,9 @@ class Tones(Result):
         The root mean square of what is left.
     """
 
-    frequencies: np.ndarray
-    amplitudes: np.ndarray
-    phases: np.ndarray
+    frequencies: NDArray[Any]
+    amplitudes: NDArray[Any]
+    phases: NDArray[Any]
     residual: float
     _unpacked = ("frequencies", "amplitudes")
 
@@ -111,9 +118,9 @@ class Harmonics(Result):
         The noise in a bin of the spectrum, in dB of the fundamental.
     """
 
-    frequencies: np.ndarray
-    amplitudes: np.ndarray
-    phases: np.ndarray
+    frequencies: NDArray[Any]
+    amplitudes: NDArray[Any]
+    phases: NDArray[Any]
     thd: float
     sinad: float
     snr: float
@@ -177,10 +184,10 @@ class Vertices(Result):
         Where the parabolas that are fitted to the samples have their vertices, and their values there.
     """
 
-    positions: np.ndarray
-    heights: np.ndarray
+    positions: NDArray[Any]
+    heights: NDArray[Any]
 
-    def __len__(self):
+    def __len__(self) -> int:
         return len(self.positions)
 
 
@@ -196,10 +203,10 @@ class Triggers(Result):
         The samples that trigger.
     """
 
-    positions: np.ndarray
-    indices: np.ndarray
+    positions: NDArray[Any]
+    indices: NDArray[Any]
 
-    def __len__(self):
+    def __len__(self) -> int:
         return len(self.positions)
 
 
@@ -217,12 +224,12 @@ class Bands(Result):
         The lower and the upper edge of each band.
     """
 
-    frequencies: np.ndarray
-    levels: np.ndarray
-    edges: np.ndarray
+    frequencies: NDArray[Any]
+    levels: NDArray[Any]
+    edges: NDArray[Any]
     _unpacked = ("frequencies", "levels")
 
-    def plot(self, axes=None):
+    def plot(self, axes: Any = None) -> Any:
         """Draws the levels as bars with matplotlib; returns the axes."""
         if axes is None:
             from matplotlib import pyplot
@@ -233,13 +240,14 @@ class Bands(Result):
         return axes
 
 
-def _rate(function, fs):
+def _rate(function: Any, fs: Any) -> Any:
     if not fs > 0:
         refuse(f"measure.{function}", "fs", f"must be above 0; {fs} came", "ErrSamplingNotPositive")
     return float(fs)
 
 
-def peaks(x, fs=1.0, height=None, prominence=None, distance=None, valleys=False):
+def peaks(x: ArrayLike, fs: float = 1.0, height: float | None = None, prominence: float | None = None,
+          distance: float | None = None, valleys: bool = False) -> Peaks:
     """The peaks of a signal, or its valleys.
 
     Parameters
@@ -295,7 +303,7 @@ def peaks(x, fs=1.0, height=None, prominence=None, distance=None, valleys=False)
     return Peaks(positions / fs, sign * heights, stand, _widths(values, at, stand) / fs, at)
 
 
-def _vertices(values, at):
+def _vertices(values: Any, at: Any) -> Any:
     """The parabolas through each sample and its neighbours; of a plateau the sample itself."""
     before, here, behind = values[at - 1], values[at], values[at + 1]
     bend = before - 2 * here + behind
@@ -304,7 +312,7 @@ def _vertices(values, at):
     return at + shift, here + (behind - before) * shift / 4
 
 
-def _widths(values, at, stand):
+def _widths(values: Any, at: Any, stand: Any) -> Any:
     """The widths half way down the prominences, in samples, between samples by straight lines."""
     found = np.zeros(len(at))
     for i, (place, prominence) in enumerate(zip(at.tolist(), stand.tolist())):
@@ -349,24 +357,24 @@ class PeakFinder(Stream):
 
     dtypes = (np.dtype(float),)
 
-    def __init__(self, threshold, width=5, fs=1.0, valleys=False):
+    def __init__(self, threshold: float, width: int = 5, fs: float = 1.0, valleys: bool = False) -> None:
         self.threshold, self.valleys = float(threshold), bool(valleys)
         self.width = whole_number("measure.PeakFinder", "width", width, 3, "ErrInvalidSelector")
         self.fs = _rate("PeakFinder", fs)
         super().__init__()
 
-    def _start(self):
+    def _start(self) -> Any:
         """What is too short for a call, the export's state and buffer, and whether it has begun."""
         return np.empty(0), {}, np.empty(0), False
 
-    def _run(self, state, block, is_last):
+    def _run(self, state: Any, block: Any, is_last: Any) -> Any:
         _, place, buffer, has_begun = state
         request = {"data": block, "threshold": self.threshold, "width": self.width,
                    "polarity": int(self.valleys), "flags": (not has_begun) + 4 * is_last}
         found, place, buffer = core.PeakFinder(request, place, buffer)
         return Vertices(found["locations"] / self.fs, found["amplitudes"]), (np.empty(0), place, buffer, True)
 
-    def _step(self, state, block):
+    def _step(self, state: Any, block: Any) -> Any:
         block = np.concatenate([state[0], block])
         if len(block) < 2 * self.width:
             return _no_vertices(), (block, *state[1:])
@@ -374,11 +382,11 @@ class PeakFinder(Stream):
         found, state = self._run(state, block[:-self.width], False)
         return found, (block[-self.width:], *state[1:])
 
-    def __call__(self, block):
+    def __call__(self, block: Any) -> Any:
         found = super().__call__(block)
         return found if isinstance(found, Vertices) else _no_vertices()
 
-    def finish(self):
+    def finish(self) -> Any:
         """The peaks of the last window; begins anew."""
         state = self._states[0]
         self.reset()
@@ -387,15 +395,15 @@ class PeakFinder(Stream):
         return self._run(state, state[0], True)[0]
 
 
-def _no_vertices():
+def _no_vertices() -> Any:
     return Vertices(np.empty(0), np.empty(0))
 
 
-def _no_triggers():
+def _no_triggers() -> Any:
     return Triggers(np.empty(0), np.empty(0, int))
 
 
-def levels(x, method="auto", bins=256):
+def levels(x: ArrayLike, method: Literal["auto", "histogram", "peak"] = "auto", bins: int = 256) -> Levels:
     """The levels of the two states of a waveform.
 
     Parameters
@@ -429,7 +437,7 @@ def levels(x, method="auto", bins=256):
     return Levels(*core.levels(vector(x, "measure.levels", "x"), 0.0, 1.0, code, bins, 0))
 
 
-def pulses(x, fs=1.0, first="rising"):
+def pulses(x: ArrayLike, fs: float = 1.0, first: Literal["rising", "falling"] = "rising") -> list[Pulse]:
     """The pulses of a waveform, up to 1000.
 
     Parameters
@@ -480,16 +488,16 @@ class Cycles(Result):
         The mean and the root mean square over each.
     """
 
-    starts: np.ndarray
-    periods: np.ndarray
-    means: np.ndarray
-    rms: np.ndarray
+    starts: NDArray[Any]
+    periods: NDArray[Any]
+    means: NDArray[Any]
+    rms: NDArray[Any]
 
-    def __len__(self):
+    def __len__(self) -> int:
         return len(self.starts)
 
 
-def cycles(x, fs=1.0):
+def cycles(x: ArrayLike, fs: float = 1.0) -> Cycles:
     """Mean and root mean square over each cycle of a waveform, between crossings of the middle of its
     two levels; up to 1000 cycles.
 
@@ -532,7 +540,7 @@ def cycles(x, fs=1.0):
     return Cycles(*np.array(found).reshape(-1, 4).T)
 
 
-def tone(x, fs=1.0, near=None, within=None):
+def tone(x: ArrayLike, fs: float = 1.0, near: float | None = None, within: float | None = None) -> Tone:
     """The largest tone, or the largest near a frequency, fitted by least squares (IEEE Std 1057).
 
     Parameters
@@ -569,7 +577,8 @@ def tone(x, fs=1.0, near=None, within=None):
     return Tone(*core.tone(x, 1 / fs, 0.0 if near is None else float(near), half))
 
 
-def tones(x, fs=1.0, count=5, order="amplitude"):
+def tones(x: ArrayLike, fs: float = 1.0, count: int = 5,
+          order: Literal["amplitude", "frequency"] = "amplitude") -> Tones:
     """The largest tones, fitted together by least squares; fewer where the rest could be noise.
 
     Parameters
@@ -606,7 +615,8 @@ def tones(x, fs=1.0, count=5, order="amplitude"):
     return Tones(*core.tones(vector(x, "measure.tones", "x"), 1 / _rate("tones", fs), count, code))
 
 
-def harmonics(x, fs=1.0, fundamental=None, count=10, full_scale=None):
+def harmonics(x: ArrayLike, fs: float = 1.0, fundamental: float | None = None, count: int = 10,
+              full_scale: float | None = None) -> Harmonics:
     """A tone, its harmonics, and the distortion and noise beside it.
 
     Parameters
@@ -646,7 +656,9 @@ def harmonics(x, fs=1.0, fundamental=None, count=10, full_scale=None):
                                      float(full_scale or 0)))
 
 
-def trigger(x, level, fs=1.0, slope="rising", hysteresis=0.0, holdoff=0.0):
+def trigger(x: ArrayLike, level: float, fs: float = 1.0,
+            slope: Literal["rising", "falling", "either"] = "rising", hysteresis: float = 0.0,
+            holdoff: float = 0.0) -> Triggers:
     """All places where a signal passes a level.
 
     Parameters
@@ -709,7 +721,8 @@ class Trigger(Stream):
 
     dtypes = (np.dtype(float),)
 
-    def __init__(self, level, fs=1.0, slope="rising", hysteresis=0.0, holdoff=0.0):
+    def __init__(self, level: float, fs: float = 1.0, slope: Literal["rising", "falling", "either"] = "rising",
+                 hysteresis: float = 0.0, holdoff: float = 0.0) -> None:
         self.slope = chosen("measure.trigger", "slope", slope, SLOPES)
         self.level, self.hysteresis, self.fs = float(level), float(hysteresis), _rate("trigger", fs)
         if not hysteresis >= 0 or not holdoff >= 0:
@@ -717,11 +730,11 @@ class Trigger(Stream):
         self.holdoff = round(holdoff * self.fs)
         super().__init__()
 
-    def _start(self):
+    def _start(self) -> Any:
         """The export's state, and the samples so far."""
         return {}, 0
 
-    def _step(self, state, block):
+    def _step(self, state: Any, block: Any) -> Any:
         place, before = state
         positions, indices, start = [], [], 0
         while start <= len(block):
@@ -734,17 +747,17 @@ class Trigger(Stream):
             start = index + 1
         return Triggers(np.array(positions) / self.fs, np.array(indices, int)), (place, before + len(block))
 
-    def __call__(self, block):
+    def __call__(self, block: Any) -> Any:
         found = super().__call__(block)
         return found if isinstance(found, Triggers) else _no_triggers()
 
-    def finish(self):
+    def finish(self) -> Any:
         """Nothing is left to come; begins anew."""
         self.reset()
         return _no_triggers()
 
 
-def delay(x, y, fs=1.0, most=None):
+def delay(x: ArrayLike, y: ArrayLike, fs: float = 1.0, most: float | None = None) -> float:
     """By how much y is later than x: the place of the peak of their cross-correlation, between samples
     by the correlation's own Fourier series, which is exact where the spectra end below fs / 2.
 
@@ -790,7 +803,7 @@ def delay(x, y, fs=1.0, most=None):
     return _refined(x, y, best) / fs
 
 
-def _refined(x, y, lag):
+def _refined(x: Any, y: Any, lag: Any) -> Any:
     """The maximum of the correlation's Fourier series near a lag, by Newton's method. Only what both have
     is correlated, under a Hann window, so that the ends do not pull."""
     first, last = max(0, -lag), min(len(x), len(y) - lag)
@@ -821,7 +834,7 @@ _F1, _F2, _F3, _F4 = 20.598997, 107.65265, 737.86223, 12194.217
 _BAND_RATIO = 10 ** 0.3  # an octave, by IEC 61260-1
 
 
-def weighting(frequencies, kind="A"):
+def weighting(frequencies: ArrayLike, kind: Literal["A", "C", "Z"] = "A") -> Any:
     r"""The frequency weighting of IEC 61672-1.
 
     .. math:: A(f) = 20 \lg \frac{f_4^2 f^4}{(f^2 + f_1^2) \sqrt{(f^2 + f_2^2)(f^2 + f_3^2)} (f^2 + f_4^2)} - A_{1000}
@@ -852,7 +865,7 @@ def weighting(frequencies, kind="A"):
     kind = chosen("measure.weighting", "kind", kind, WEIGHTINGS)
     f = np.asarray(frequencies, float)
 
-    def gain(f):
+    def gain(f: Any) -> Any:
         f = f * f
         c = _F4**2 * f / ((f + _F1**2) * (f + _F4**2))
         return c if kind == "C" else c * f / np.sqrt((f + _F2**2) * (f + _F3**2))
@@ -863,7 +876,7 @@ def weighting(frequencies, kind="A"):
         return (20 * np.log10(gain(f) / gain(np.float64(1000.0))))[()]
 
 
-def weighting_filter(fs, kind="A"):
+def weighting_filter(fs: float, kind: Literal["A", "C"] = "A") -> filters.Filter:
     """The A or C weighting as a filter: the poles of IEC 61672-1 by the bilinear transform, 0 dB at 1
     kHz. Within class 1 up to 16 kHz at rates from 48 kHz on.
 
@@ -911,7 +924,8 @@ def weighting_filter(fs, kind="A"):
     return found
 
 
-def sound_level(x, fs, weighting="A", reference=2e-5, axis=LAST):
+def sound_level(x: ArrayLike, fs: float, weighting: Literal["A", "C", "Z"] = "A", reference: float = 2e-5,
+                axis: int = LAST) -> Any:
     """The equivalent level of a sound pressure.
 
     Parameters
@@ -946,14 +960,15 @@ def sound_level(x, fs, weighting="A", reference=2e-5, axis=LAST):
     kind = chosen("measure.sound_level", "weighting", weighting, WEIGHTINGS)
     f = None if kind == "Z" else weighting_filter(fs, kind)
 
-    def of_channel(channel):
+    def of_channel(channel: Any) -> Any:
         mean_square = core.sound_level(f(channel) if f else channel)**2
         return 10 * math.log10(mean_square / reference**2) if mean_square else -math.inf
 
     return along(of_channel, x, axis)
 
 
-def octave_bands(x, fs, fraction=3, low=25.0, high=None, reference=1.0, axis=LAST):
+def octave_bands(x: ArrayLike, fs: float, fraction: int = 3, low: float | None = 25.0,
+                 high: float | None = None, reference: float = 1.0, axis: int = LAST) -> Bands:
     """The levels in bands of an octave or a fraction of one, by Butterworth bandpass filters with the
     midband frequencies and edges of IEC 61260-1. Low bands are filtered at a lower rate.
 
@@ -994,15 +1009,15 @@ def octave_bands(x, fs, fraction=3, low=25.0, high=None, reference=1.0, axis=LAS
     name = "measure.octave_bands"
     fs = _rate("octave_bands", fs)
     fraction = whole_number(name, "fraction", fraction, 1)
-    middles = band_frequencies(fraction, low, 0.45 * fs / _BAND_RATIO**(0.5 / fraction) if high is None else high)
+    half = _BAND_RATIO ** (0.5 / fraction)
+    middles = band_frequencies(fraction, low, 0.45 * fs / half if high is None else high)
     if not len(middles):
         refuse(name, "low, high", "there is no band between them", "ErrRangeReversed")
-    half = _BAND_RATIO ** (0.5 / fraction)
     if middles[-1] * half >= fs / 2:
         refuse(name, "high", f"the band at {middles[-1]:.5g} ends above half the sampling rate, {fs / 2:g}",
                "ErrAboveNyquist")
 
-    def of_channel(channel):
+    def of_channel(channel: Any) -> Any:
         found, rate = np.empty(len(middles)), fs
         channel = np.asarray(channel, float)
         for i in range(len(middles) - 1, -1, -1):
@@ -1016,12 +1031,12 @@ def octave_bands(x, fs, fraction=3, low=25.0, high=None, reference=1.0, axis=LAS
     return Bands(middles, along(of_channel, x, axis), np.stack([middles / half, middles * half], -1))
 
 
-def _band_filter(middle, half, rate):
+def _band_filter(middle: Any, half: Any, rate: Any) -> Any:
     from . import filters
     return filters.butterworth(3, (middle / half, middle * half), "bandpass", rate)
 
 
-def band_frequencies(fraction=3, low=25.0, high=20000.0):
+def band_frequencies(fraction: int = 3, low: float = 25.0, high: float = 20000.0) -> NDArray[np.float64]:
     r"""The exact midband frequencies of IEC 61260-1 with base 10.
 
     .. math:: f_k = 1000 \cdot 10^{0.3 k / b}
@@ -1055,7 +1070,7 @@ def band_frequencies(fraction=3, low=25.0, high=20000.0):
     shift = 0.0 if fraction % 2 else 0.5  # even fractions have no band at 1 kHz
     step = 0.3 / fraction
 
-    def index(f):
+    def index(f: Any) -> Any:
         return math.log10(f / 1000) / step - shift
 
     first, last = math.ceil(index(low) - 0.25), math.floor(index(high) + 0.25)

@@ -3,9 +3,13 @@
 Each function has a class of its name's stream: blocks of any size give the bits of one piece.
 """
 
+from __future__ import annotations
+
 import math
+from typing import Any, Literal
 
 import numpy as np
+from numpy.typing import ArrayLike, DTypeLike, NDArray
 
 from .topical import LAST, Stream, along, chosen, either, refuse, served, vector, whole_number
 
@@ -22,7 +26,8 @@ OVERSAMPLE, HALF_KERNEL = 256, 32  # entries a sample, and samples to each side,
 ALL_TYPES = tuple(map(np.dtype, (np.float64, np.complex128, np.float32, np.complex64)))
 
 
-def low_pass(up, down, attenuation=ATTENUATION, passband=PASSBAND):
+def low_pass(up: int, down: int, attenuation: float = ATTENUATION,
+             passband: float = PASSBAND) -> NDArray[np.float64]:
     """The taps for a change of the rate by up / down: a cardinal sine under a Kaiser window, of odd
     number and unit sum.
 
@@ -56,7 +61,7 @@ def low_pass(up, down, attenuation=ATTENUATION, passband=PASSBAND):
     return taps / taps.sum()
 
 
-def _ratio(function, up, down):
+def _ratio(function: Any, up: Any, down: Any) -> Any:
     up, down = (whole_number(function, name, value, 1, "ErrNotStrictlyPositive")
                 for name, value in (("up", up), ("down", down)))
     common = math.gcd(up, down)
@@ -92,7 +97,8 @@ class Resampler(Stream):
 
     dtypes = ALL_TYPES
 
-    def __init__(self, up, down, channels=None, axis=-1, dtype=float, taps=None):
+    def __init__(self, up: int, down: int, channels: int | None = None, axis: int = -1,
+                 dtype: DTypeLike = float, taps: ArrayLike | None = None) -> None:
         self.up, self.down = _ratio("multirate.Resampler", up, down)
         taps = low_pass(self.up, self.down) if taps is None else vector(taps, "multirate.resample", "taps")
         if len(taps) % 2 == 0:
@@ -100,14 +106,14 @@ class Resampler(Stream):
         single = np.dtype(dtype) in (np.float32, np.complex64)
         self.taps = np.asarray(taps, np.float32 if single else float)
         self._run = {"float64": "resample", "complex128": "resample_complex", "float32": "resample_single",
-                     "complex64": "resample_complex_single"}.get(np.dtype(dtype).name)
+                     "complex64": "resample_complex_single"}.get(np.dtype(dtype).name, "")
         super().__init__(channels, axis, dtype)
 
-    def _start(self):
+    def _start(self) -> Any:
         """State, delay to be taken off, phase, values read and written."""
         return None, 0, 0, 0, 0
 
-    def _step(self, begun, block):
+    def _step(self, begun: Any, block: Any) -> Any:
         state, delay, phase, read, written = begun
         if self.up == self.down:
             return block.copy(), begun
@@ -117,7 +123,7 @@ class Resampler(Stream):
             int(is_new), 1, delay, phase)
         return found, (state, delay, phase, read + len(block), written + len(found))
 
-    def _end(self, begun):
+    def _end(self, begun: Any) -> Any:
         read, written = begun[3:]
         due = -(-read * self.up // self.down) - written
         if due <= 0:
@@ -126,7 +132,8 @@ class Resampler(Stream):
         return self._step(begun, behind)[0][:due]
 
 
-def resample(x, up, down=1, axis=LAST, taps=None):
+def resample(x: ArrayLike, up: int, down: int = 1, axis: int = LAST,
+             taps: ArrayLike | None = None) -> NDArray[Any]:
     """The signal at up / down times its rate, without delay.
 
     Parameters
@@ -160,7 +167,7 @@ def resample(x, up, down=1, axis=LAST, taps=None):
     >>> len(found), bool(abs(found[400:500] - qx.signals.sine(919, 10, fs=918.75)[400:500]).max() < 1e-5)
     (919, True)
     """
-    def of_channel(channel):
+    def of_channel(channel: Any) -> Any:
         dtype = channel.dtype if channel.dtype in ALL_TYPES else np.dtype(float)
         stream = Resampler(up, down, dtype=dtype, taps=taps)
         begun = stream(channel)
@@ -170,7 +177,7 @@ def resample(x, up, down=1, axis=LAST, taps=None):
     return along(of_channel, x, axis)
 
 
-def respace(x, spacing, start=0.0, axis=LAST):
+def respace(x: ArrayLike, spacing: float, start: float = 0.0, axis: int = LAST) -> NDArray[Any]:
     """The signal at any constant spacing of times, which need not be a ratio of whole numbers: by a
     cardinal sine under a Kaiser window, read along lines between 256 entries a sample.
 
@@ -210,7 +217,7 @@ def respace(x, spacing, start=0.0, axis=LAST):
     kernel = _kernel()
     design = {"ratio": float(spacing), "mode": 0, "start": float(start), "proto": kernel, "oversample": OVERSAMPLE}
 
-    def of_channel(channel):
+    def of_channel(channel: Any) -> Any:
         n = len(channel)
         if not n:
             refuse(name, "x", "is empty", "ErrEmptyInput")
@@ -224,7 +231,7 @@ def respace(x, spacing, start=0.0, axis=LAST):
     return along(of_channel, x, axis)
 
 
-def _kernel():
+def _kernel() -> Any:
     """The table of the kernel: OVERSAMPLE entries a sample, unit sum."""
     t = np.arange(-HALF_KERNEL * OVERSAMPLE, HALF_KERNEL * OVERSAMPLE + 1) / OVERSAMPLE
     kernel = np.sinc(0.9 * t) * np.kaiser(len(t), 0.1102 * (100 - 8.7))
@@ -255,22 +262,24 @@ class Decimator(Stream):
     (array([2.]), array([6.]))
     """
 
-    def __init__(self, factor, average=False, channels=None, axis=-1, dtype=float):
+    def __init__(self, factor: int, average: bool = False, channels: int | None = None, axis: int = -1,
+                 dtype: type[float] | type[complex] = float) -> None:
         self.factor = whole_number("multirate.Decimator", "factor", factor, 1, "ErrNotStrictlyPositive")
         self.average = bool(average)
         super().__init__(channels, axis, dtype)
 
-    def _start(self):
+    def _start(self) -> Any:
         return 0, 1, 0, self.dtype.type(0)
 
-    def _step(self, state, block):
+    def _step(self, state: Any, block: Any) -> Any:
         start, reset, count, total = state
         run = core.decimate_complex if self.dtype.kind == "c" else core.decimate
         found, start, count, total = run(block, self.factor, int(self.average), start, reset, count, total)
         return found, (start, 0, count, total)
 
 
-def decimate(x, factor, method="filter", axis=LAST):
+def decimate(x: ArrayLike, factor: int, method: Literal["filter", "average", "pick"] = "filter",
+             axis: int = LAST) -> NDArray[Any]:
     """Every factor-th value: behind a filter, of means, or as they are.
 
     Parameters
@@ -300,13 +309,13 @@ def decimate(x, factor, method="filter", axis=LAST):
     >>> qx.multirate.decimate([1.0, 3.0, 5.0, 7.0], 2, "average")
     array([2., 6.])
     """
-    method = chosen("multirate.decimate", "method", method, {"filter": 0, "average": 1, "pick": 2})
+    way = chosen("multirate.decimate", "method", method, {"filter": 0, "average": 1, "pick": 2})
     factor = whole_number("multirate.decimate", "factor", factor, 1, "ErrNotStrictlyPositive")
-    if not method:
+    if not way:
         return resample(x, 1, factor, axis)
 
-    def of_channel(channel):
-        return Decimator(factor, method == 1, dtype=complex if channel.dtype.kind == "c" else float)(channel)
+    def of_channel(channel: Any) -> Any:
+        return Decimator(factor, way == 1, dtype=complex if channel.dtype.kind == "c" else float)(channel)
 
     return along(of_channel, x, axis)
 
@@ -335,15 +344,16 @@ class MovingSum(Stream):
     (array([1., 3.]), array([5.]))
     """
 
-    def __init__(self, width, stages=1, channels=None, axis=-1, dtype=float):
+    def __init__(self, width: int, stages: int = 1, channels: int | None = None, axis: int = -1,
+                 dtype: type[float] | type[complex] = float) -> None:
         self.width = whole_number("multirate.MovingSum", "width", width, 1, "ErrNotStrictlyPositive")
         self.stages = whole_number("multirate.MovingSum", "stages", stages, 1, "ErrNotStrictlyPositive")
         super().__init__(channels, axis, dtype)
 
-    def _start(self):
+    def _start(self) -> Any:
         return (np.zeros(self.stages, self.dtype), np.zeros((self.stages, self.width), self.dtype), 0)
 
-    def _step(self, state, block):
+    def _step(self, state: Any, block: Any) -> Any:
         if self.width == 1:
             return block.copy(), state
         run = core.moving_sum_complex if self.dtype.kind == "c" else core.moving_sum
@@ -351,7 +361,7 @@ class MovingSum(Stream):
         return found, tuple(state)
 
 
-def moving_sum(x, width, stages=1, axis=LAST):
+def moving_sum(x: ArrayLike, width: int, stages: int = 1, axis: int = LAST) -> Any:
     r"""The sums of each value and the width - 1 before it, zeros before the first one.
 
     .. math:: y_i = \sum_{j=0}^{w-1} x_{i-j}
@@ -389,7 +399,7 @@ def moving_sum(x, width, stages=1, axis=LAST):
         if np.ndim(x) == 1 else along(lambda channel: moving_sum(channel, width, stages), x, axis)
 
 
-def moving_average(x, width, stages=1, axis=LAST):
+def moving_average(x: ArrayLike, width: int, stages: int = 1, axis: int = LAST) -> Any:
     """The sums of `moving_sum` over the number of their values, width^stages: before the width-th value,
     whose sum has fewer, they begin from 0.
 
@@ -423,7 +433,8 @@ def moving_average(x, width, stages=1, axis=LAST):
     return moving_sum(x, width, stages, axis) / float(width)**stages
 
 
-def cic_decimate(x, factor, stages=3, differential_delay=1, axis=LAST):
+def cic_decimate(x: ArrayLike, factor: int, stages: int = 3, differential_delay: int = 1,
+                 axis: int = LAST) -> NDArray[np.float64]:
     """Decimation behind a cascaded integrator-comb filter of unit gain at frequency 0.
 
     Parameters
@@ -458,7 +469,8 @@ def cic_decimate(x, factor, stages=3, differential_delay=1, axis=LAST):
                  x, axis)
 
 
-def cic_interpolate(x, factor, stages=3, differential_delay=1, axis=LAST):
+def cic_interpolate(x: ArrayLike, factor: int, stages: int = 3, differential_delay: int = 1,
+                    axis: int = LAST) -> NDArray[np.float64]:
     """Interpolation by a cascaded integrator-comb filter of unit gain at frequency 0.
 
     Parameters
@@ -520,16 +532,17 @@ class FrequencyShift(Stream):
 
     _output = complex
 
-    def __init__(self, frequency, fs=1.0, channels=None, axis=-1, dtype=float):
+    def __init__(self, frequency: float, fs: float = 1.0, channels: int | None = None, axis: int = -1,
+                 dtype: type[float] | type[complex] = float) -> None:
         if not fs > 0:
             refuse("multirate.FrequencyShift", "fs", f"must be above 0; {fs} came", "ErrSamplingNotPositive")
         self.frequency, self.fs = float(frequency), float(fs)
         super().__init__(channels, axis, dtype)
 
-    def _start(self):
+    def _start(self) -> Any:
         return 0.0
 
-    def _step(self, phase, block):
+    def _step(self, phase: Any, block: Any) -> Any:
         if self.dtype.kind == "c":
             found, phase = core.shift_frequency_complex(block, self.frequency, self.fs, phase)
         else:
@@ -537,7 +550,8 @@ class FrequencyShift(Stream):
         return found, phase
 
 
-def shift_frequency(x, frequency, fs=1.0, axis=LAST):
+def shift_frequency(x: ArrayLike, frequency: float, fs: float = 1.0,
+                    axis: int = LAST) -> NDArray[np.complex128]:
     r"""The signal shifted in frequency.
 
     .. math:: y_i = x_i e^{2\pi \mathrm{j} f i / f_s}

@@ -8,10 +8,14 @@ portable pseudo-random number generator", 1982. Streams of different seeds are n
 channels go on with one generator.
 """
 
+from __future__ import annotations
+
 import copy
 import os
+from typing import Any
 
 import numpy as np
+from numpy.typing import ArrayLike, NDArray
 
 from .topical import refuse, served, whole_number
 
@@ -42,7 +46,7 @@ class Generator:
     True
     """
 
-    def __init__(self, seed=None):
+    def __init__(self, seed: int | None = None) -> None:
         if seed is not None:
             seed = whole_number("noise.Generator", "seed", seed, 1, "ErrCountNotPositive")
             if seed > LARGEST_SEED:
@@ -50,48 +54,48 @@ class Generator:
         self.seed = seed
         self.reset()
 
-    def reset(self):
+    def reset(self) -> None:
         """Begins anew: with the same numbers where there is a seed."""
         self._seed, self._spare, self._cache = self.seed or 0, {}, {}
         self._state = {} if self.seed else {name: 1 + int.from_bytes(os.urandom(8), "little") % (modulus - 1)
                                             for name, modulus in zip(("s1", "s2", "s3"), MODULI)}
 
-    def copy(self):
+    def copy(self) -> Any:
         """A generator that gives the same numbers from here on."""
         return copy.deepcopy(self)
 
-    def _begun(self):
+    def _begun(self) -> Any:
         """The seed for the next call: its own for the first one, then 0, which goes on."""
         seed, self._seed = self._seed, 0
         return seed
 
-    def uniform(self, n, amplitude=1.0):
+    def uniform(self, n: Any, amplitude: Any = 1.0) -> Any:
         """n values spread evenly over -amplitude to below amplitude."""
         n = whole_number("noise.uniform", "n", n, 1)
         x, self._state = core.uniform(n, float(amplitude), self._begun(), self._state)
         return x
 
-    def gaussian(self, n, sigma=1.0):
+    def gaussian(self, n: Any, sigma: Any = 1.0) -> Any:
         """n values of a normal distribution of mean 0 and standard deviation sigma."""
         n = whole_number("noise.gaussian", "n", n, 1)
         x, self._state, self._spare = core.gaussian(n, float(sigma), self._begun(), self._state, self._spare)
         return x
 
-    def periodic(self, n, amplitude=1.0):
+    def periodic(self, n: Any, amplitude: Any = 1.0) -> Any:
         """One period of n values of cosines of this amplitude at all whole frequencies, with random
         phases."""
         n = whole_number("noise.periodic", "n", n, 1)
         x, self._state = core.periodic(n, float(amplitude), self._begun(), self._state)
         return x
 
-    def gamma(self, n, order=1):
+    def gamma(self, n: Any, order: Any = 1) -> Any:
         """n waiting times for `order` events of a Poisson process of rate 1."""
         n = whole_number("noise.gamma", "n", n, 1)
         order = whole_number("noise.gamma", "order", order, 1, "ErrInvalidSelector")
         x, self._state = core.gamma(n, order, self._begun(), self._state)
         return x
 
-    def poisson(self, n, mean=1.0):
+    def poisson(self, n: Any, mean: Any = 1.0) -> Any:
         """n numbers of events whose mean is given."""
         n = whole_number("noise.poisson", "n", n, 1)
         if not mean >= 0:
@@ -99,7 +103,7 @@ class Generator:
         x, self._state = core.poisson(n, float(mean), self._begun(), self._state)
         return x
 
-    def binomial(self, n, trials=1, p=0.5):
+    def binomial(self, n: Any, trials: Any = 1, p: Any = 0.5) -> Any:
         """n numbers of successes among trials of probability p."""
         n = whole_number("noise.binomial", "n", n, 1)
         trials = whole_number("noise.binomial", "trials", trials, 0, "ErrInvalidSelector")
@@ -108,19 +112,19 @@ class Generator:
         x, self._state, self._cache = core.binomial(n, trials, float(p), self._begun(), self._state, self._cache)
         return x.astype(np.int64)
 
-    def permutation(self, n):
+    def permutation(self, n: Any) -> Any:
         """0 to n - 1 in a random order, all orders equally likely."""
         n = whole_number("noise.permutation", "n", n, 1)
         x, self._state = core.permutation(n, self._begun(), self._state, 1)
         return x
 
-    def shuffle(self, x):
+    def shuffle(self, x: Any) -> Any:
         """The elements of x, along the first axis, in a random order."""
         x = np.asarray(x)
         return x[self.permutation(len(x))]
 
 
-def uniform(n, amplitude=1.0, seed=None):
+def uniform(n: int, amplitude: float = 1.0, seed: int | None = None) -> NDArray[Any]:
     """Uniform white noise: values spread evenly over -amplitude to below amplitude.
 
     Parameters
@@ -150,7 +154,7 @@ def uniform(n, amplitude=1.0, seed=None):
     return Generator(seed).uniform(n, amplitude)
 
 
-def gaussian(n, sigma=1.0, seed=None):
+def gaussian(n: int, sigma: float = 1.0, seed: int | None = None) -> NDArray[Any]:
     """Gaussian white noise of mean 0, by the polar method of G. Marsaglia and T. A. Bray, 1964.
 
     Parameters
@@ -180,7 +184,7 @@ def gaussian(n, sigma=1.0, seed=None):
     return Generator(seed).gaussian(n, sigma)
 
 
-def periodic(n, amplitude=1.0, seed=None):
+def periodic(n: int, amplitude: float = 1.0, seed: int | None = None) -> NDArray[Any]:
     """One period of cosines at 1, 2, ..., (n - 1) / 2 cycles, each of the same amplitude, with random phases: noise
     whose spectrum is flat over whole numbers of periods.
 
@@ -211,7 +215,7 @@ def periodic(n, amplitude=1.0, seed=None):
     return Generator(seed).periodic(n, amplitude)
 
 
-def gamma(n, order=1, seed=None):
+def gamma(n: int, order: int = 1, seed: int | None = None) -> NDArray[Any]:
     """Gamma noise: waiting times for `order` events of a Poisson process of rate 1.
 
     Parameters
@@ -241,7 +245,7 @@ def gamma(n, order=1, seed=None):
     return Generator(seed).gamma(n, order)
 
 
-def poisson(n, mean=1.0, seed=None):
+def poisson(n: int, mean: float = 1.0, seed: int | None = None) -> NDArray[Any]:
     """Poisson noise: numbers of events.
 
     Parameters
@@ -271,7 +275,7 @@ def poisson(n, mean=1.0, seed=None):
     return Generator(seed).poisson(n, mean)
 
 
-def binomial(n, trials=1, p=0.5, seed=None):
+def binomial(n: int, trials: int = 1, p: float = 0.5, seed: int | None = None) -> NDArray[Any]:
     """Binomial noise: numbers of successes.
 
     Parameters
@@ -303,7 +307,7 @@ def binomial(n, trials=1, p=0.5, seed=None):
     return Generator(seed).binomial(n, trials, p)
 
 
-def permutation(n, seed=None):
+def permutation(n: int, seed: int | None = None) -> NDArray[np.int32]:
     """0 to n - 1 in a random order, all orders equally likely (R. Durstenfeld, "Algorithm 235: Random
     permutation", 1964).
 
@@ -332,7 +336,7 @@ def permutation(n, seed=None):
     return Generator(seed).permutation(n)
 
 
-def shuffle(x, seed=None):
+def shuffle(x: ArrayLike, seed: int | None = None) -> NDArray[Any]:
     """The elements of x, along the first axis, in a random order, all orders equally likely.
 
     Parameters

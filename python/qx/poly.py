@@ -2,7 +2,12 @@
 real or complex.
 """
 
+from __future__ import annotations
+
+from typing import Any
+
 import numpy as np
+from numpy.typing import ArrayLike, NDArray
 
 from .topical import Result, result, served, vector, whole_number
 
@@ -13,12 +18,12 @@ __all__ = ["PartialFractions", "Roots", "add", "compose", "derivative", "divide"
 core = served("poly")
 
 
-def _given(function, *polynomials):
+def _given(function: Any, *polynomials: Any) -> Any:
     given = [vector(p, f"poly.{function}", "coefficients") for p in polynomials]
     return given, any(p.dtype.kind == "c" for p in given)
 
 
-def _of(function, *polynomials):
+def _of(function: Any, *polynomials: Any) -> Any:
     given, is_complex = _given(function, *polynomials)
     return getattr(core, function + "_complex" if is_complex else function)(*given)
 
@@ -35,8 +40,8 @@ class Roots(Result):
         How often it is one.
     """
 
-    roots: np.ndarray
-    multiplicities: np.ndarray
+    roots: NDArray[Any]
+    multiplicities: NDArray[Any]
 
 
 @result
@@ -53,12 +58,12 @@ class PartialFractions(Result):
         Beside the k-th of equal poles the factor of 1 / (x - pole)^k.
     """
 
-    polynomial: np.ndarray
-    poles: np.ndarray
-    residues: np.ndarray
+    polynomial: NDArray[Any]
+    poles: NDArray[Any]
+    residues: NDArray[Any]
 
 
-def add(p, q):
+def add(p: ArrayLike, q: ArrayLike) -> NDArray[Any]:
     """The sum of two polynomials.
 
     Parameters
@@ -84,7 +89,7 @@ def add(p, q):
     return _of("add", p, q)
 
 
-def subtract(p, q):
+def subtract(p: ArrayLike, q: ArrayLike) -> NDArray[Any]:
     """The difference of two polynomials.
 
     Parameters
@@ -110,7 +115,7 @@ def subtract(p, q):
     return _of("subtract", p, q)
 
 
-def multiply(p, q):
+def multiply(p: ArrayLike, q: ArrayLike) -> NDArray[Any]:
     """The product of two polynomials.
 
     Parameters
@@ -136,7 +141,7 @@ def multiply(p, q):
     return _of("multiply", p, q)
 
 
-def divide(p, q):
+def divide(p: ArrayLike, q: ArrayLike) -> tuple[NDArray[Any], NDArray[Any]]:
     r"""Quotient and remainder of a division.
 
     .. math:: p = s q + r
@@ -164,7 +169,7 @@ def divide(p, q):
     return _of("divide", p, q)
 
 
-def gcd(p, q, tolerance=1e-10):
+def gcd(p: ArrayLike, q: ArrayLike, tolerance: float = 1e-10) -> NDArray[Any]:
     """The monic divisor of the highest degree of polynomials within a relative distance of p and q (Z.
     Zeng, "Computing multiple roots of inexact polynomials", 2005).
 
@@ -194,7 +199,7 @@ def gcd(p, q, tolerance=1e-10):
     return (core.gcd_complex if is_complex else core.gcd)(*given, float(tolerance))[0]
 
 
-def lcm(p, q, tolerance=1e-10):
+def lcm(p: ArrayLike, q: ArrayLike, tolerance: float = 1e-10) -> NDArray[Any]:
     """The monic least common multiple of real polynomials within a relative distance of p and q.
 
     Parameters
@@ -223,7 +228,7 @@ def lcm(p, q, tolerance=1e-10):
     return core.lcm(*given, float(tolerance))
 
 
-def evaluate(p, x):
+def evaluate(p: ArrayLike, x: ArrayLike) -> Any:
     r"""The values of a polynomial, as accurate as if computed with twice the digits (S. Graillat, P.
     Langlois and N. Louvet, "Compensated Horner scheme", 2005).
 
@@ -258,7 +263,7 @@ def evaluate(p, x):
     return run(*given, x.ravel()).reshape(x.shape)[()]
 
 
-def evaluate_matrix(p, a):
+def evaluate_matrix(p: ArrayLike, a: ArrayLike) -> NDArray[Any]:
     r"""A polynomial of a square matrix (M. S. Paterson and L. J. Stockmeyer, "On the number of nonscalar
     multiplications necessary to evaluate polynomials", 1973).
 
@@ -295,7 +300,7 @@ def evaluate_matrix(p, a):
     return run(*given, a, 1)
 
 
-def derivative(p, m=1):
+def derivative(p: ArrayLike, m: int = 1) -> NDArray[Any]:
     """The m-th derivative.
 
     Parameters
@@ -325,7 +330,7 @@ def derivative(p, m=1):
     return (core.derivative_complex if is_complex else core.derivative)(*given, m)
 
 
-def integral(p, constant=0.0):
+def integral(p: ArrayLike, constant: complex = 0.0) -> NDArray[Any]:
     """The integral with a given value at 0.
 
     Parameters
@@ -353,10 +358,10 @@ def integral(p, constant=0.0):
     given, is_complex = _given("integral", p)
     if is_complex or np.iscomplexobj(constant):
         return core.integral_complex(*given, complex(constant))
-    return core.integral(*given, float(constant))
+    return core.integral(*given, float(constant.real))
 
 
-def compose(p, q):
+def compose(p: ArrayLike, q: ArrayLike) -> NDArray[Any]:
     """The polynomial p(q(x)).
 
     Parameters
@@ -382,7 +387,7 @@ def compose(p, q):
     return _of("compose", p, q)
 
 
-def from_roots(roots):
+def from_roots(roots: ArrayLike) -> NDArray[Any]:
     """The monic polynomial with these roots; real where they are real or come in conjugate pairs.
 
     Parameters
@@ -416,7 +421,7 @@ def from_roots(roots):
     return core.from_roots(given)
 
 
-def roots(p):
+def roots(p: ArrayLike) -> NDArray[np.complex128]:
     """All roots, each as often as its multiplicity.
 
     Parameters
@@ -443,7 +448,7 @@ def roots(p):
     return np.repeat(found.roots, found.multiplicities)
 
 
-def multiple_roots(p, tolerance=1e-10):
+def multiple_roots(p: ArrayLike, tolerance: float = 1e-10) -> Roots:
     """The distinct roots with their multiplicities: a multiple root is as accurate as a simple one (Z.
     Zeng, "Computing multiple roots of inexact polynomials", 2005).
 
@@ -477,7 +482,8 @@ def multiple_roots(p, tolerance=1e-10):
     return Roots(refined, multiplicities)
 
 
-def partial_fractions(numerator, denominator, tolerance=1e-10):
+def partial_fractions(numerator: ArrayLike, denominator: ArrayLike,
+                      tolerance: float = 1e-10) -> PartialFractions:
     r"""The partial fractions of a real rational function.
 
     .. math:: \frac{n(x)}{d(x)} = p(x) + \sum_{z,k} \frac{r_{zk}}{(x - z)^k}

@@ -4,9 +4,13 @@ correlation.
 Frequencies are in the unit of the sampling rate `fs`, phases in radians.
 """
 
+from __future__ import annotations
+
 import math
+from typing import Any, Literal
 
 import numpy as np
+from numpy.typing import ArrayLike, NDArray
 
 from .topical import LAST, along, chosen, refuse, served, vector, whole_number
 from .topical.axes import as_array
@@ -24,27 +28,28 @@ METHODS = {"direct": 0, "fft": 1}
 DIRECT = 64  # up to the shorter length direct sums are faster than transforms
 
 
-def _wave(name, n, frequency, fs, amplitude, phase, *more):
+def _wave(name: Any, n: Any, frequency: Any, fs: Any, amplitude: Any, phase: Any, *more: Any) -> Any:
     n = whole_number(f"signals.{name}", "n", n, 1)
     if not fs > 0:
         refuse(f"signals.{name}", "fs", f"must be above 0; {fs} came", "ErrSamplingNotPositive")
     return getattr(core, name)(n, float(amplitude), frequency / fs, math.degrees(phase), *more)[0]
 
 
-def _of_times(name, t, *arguments):
+def _of_times(name: Any, t: Any, *arguments: Any) -> Any:
     """A pulse at times of the caller's, of any shape."""
     times = _times(name, t)
     return getattr(core, name)(times.ravel(), 0, *arguments).reshape(times.shape)
 
 
-def _times(name, t):
+def _times(name: Any, t: Any) -> Any:
     times = np.asarray(t, float)
     if not times.size:
         refuse(f"signals.{name}", "t", "is empty", "ErrEmptyInput")
     return times
 
 
-def sine(n, frequency, fs=1.0, amplitude=1.0, phase=0.0):
+def sine(n: int, frequency: float, fs: float = 1.0, amplitude: float = 1.0,
+         phase: float = 0.0) -> NDArray[np.float64]:
     r"""A sine wave.
 
     .. math:: x_i = A \sin(2\pi f i / f_s + \varphi)
@@ -80,7 +85,8 @@ def sine(n, frequency, fs=1.0, amplitude=1.0, phase=0.0):
     return _wave("sine", n, frequency, fs, amplitude, phase)
 
 
-def square(n, frequency, fs=1.0, amplitude=1.0, phase=0.0, duty=0.5):
+def square(n: int, frequency: float, fs: float = 1.0, amplitude: float = 1.0, phase: float = 0.0,
+           duty: float = 0.5) -> NDArray[np.float64]:
     """A square wave between amplitude and -amplitude.
 
     Parameters
@@ -116,7 +122,8 @@ def square(n, frequency, fs=1.0, amplitude=1.0, phase=0.0, duty=0.5):
     return _wave("square", n, frequency, fs, amplitude, phase, 100 * float(duty))
 
 
-def triangle(n, frequency, fs=1.0, amplitude=1.0, phase=0.0):
+def triangle(n: int, frequency: float, fs: float = 1.0, amplitude: float = 1.0,
+             phase: float = 0.0) -> NDArray[np.float64]:
     """A triangle wave, which begins as a sine does: up from 0.
 
     Parameters
@@ -150,7 +157,8 @@ def triangle(n, frequency, fs=1.0, amplitude=1.0, phase=0.0):
     return _wave("triangle", n, frequency, fs, amplitude, phase)
 
 
-def sawtooth(n, frequency, fs=1.0, amplitude=1.0, phase=0.0):
+def sawtooth(n: int, frequency: float, fs: float = 1.0, amplitude: float = 1.0,
+             phase: float = 0.0) -> NDArray[np.float64]:
     """A sawtooth wave: up from 0 to amplitude in half a period, and from -amplitude to 0 in the other
     half.
 
@@ -185,7 +193,8 @@ def sawtooth(n, frequency, fs=1.0, amplitude=1.0, phase=0.0):
     return _wave("sawtooth", n, frequency, fs, amplitude, phase)
 
 
-def arbitrary(n, table, frequency, fs=1.0, amplitude=1.0, phase=0.0, interpolate=True):
+def arbitrary(n: int, table: ArrayLike, frequency: float, fs: float = 1.0, amplitude: float = 1.0,
+              phase: float = 0.0, interpolate: bool = True) -> NDArray[np.float64]:
     """A wave whose period is in a table.
 
     Parameters
@@ -224,7 +233,7 @@ def arbitrary(n, table, frequency, fs=1.0, amplitude=1.0, phase=0.0, interpolate
                  vector(table, "signals.arbitrary", "table"), int(interpolate))
 
 
-def chirp(n, f0, f1, fs=1.0, amplitude=1.0):
+def chirp(n: int, f0: float, f1: float, fs: float = 1.0, amplitude: float = 1.0) -> NDArray[np.float64]:
     r"""A sine whose frequency rises evenly from f0 at the first value to f1 one behind the last.
 
     .. math:: x_i = A \sin\left(2\pi i \left(f_0 + \frac{f_1 - f_0}{2n} i\right) / f_s\right)
@@ -261,7 +270,7 @@ def chirp(n, f0, f1, fs=1.0, amplitude=1.0):
     return core.chirp(n, float(amplitude), f0 / fs, f1 / fs)
 
 
-def pulse(n, delay, width, amplitude=1.0):
+def pulse(n: int, delay: int, width: int, amplitude: float = 1.0) -> NDArray[np.float64]:
     """A rectangle: `width` values of amplitude from `delay` on, the others 0.
 
     Parameters
@@ -294,7 +303,7 @@ def pulse(n, delay, width, amplitude=1.0):
     return core.pulse(n, float(amplitude), delay, width)
 
 
-def impulse(n, delay=0, amplitude=1.0):
+def impulse(n: int, delay: int = 0, amplitude: float = 1.0) -> NDArray[np.float64]:
     """One value of amplitude, the others 0.
 
     Parameters
@@ -325,7 +334,8 @@ def impulse(n, delay=0, amplitude=1.0):
     return core.impulse(n, float(amplitude), delay)
 
 
-def ramp(n, start, stop, endpoint=True, scale="linear"):
+def ramp(n: int, start: float, stop: float, endpoint: bool = True,
+         scale: Literal["linear", "geometric"] = "linear") -> NDArray[np.float64]:
     """Values from start to stop, evenly spaced or in equal ratios.
 
     Parameters
@@ -359,7 +369,7 @@ def ramp(n, start, stop, endpoint=True, scale="linear"):
     return core.ramp(n, float(start), float(stop), int(not endpoint), code)
 
 
-def sinc(n, dt=1.0, delay=0.0, amplitude=1.0):
+def sinc(n: int, dt: float = 1.0, delay: float = 0.0, amplitude: float = 1.0) -> NDArray[np.float64]:
     r"""The cardinal sine.
 
     .. math:: x_i = A \frac{\sin \pi t}{\pi t},\quad t = i\,\Delta t - d
@@ -394,7 +404,8 @@ def sinc(n, dt=1.0, delay=0.0, amplitude=1.0):
     return core.sinc(n, float(amplitude), float(delay), float(dt))
 
 
-def gauss_pulse(t, fc, bandwidth=0.5, level=-6.0, amplitude=1.0):
+def gauss_pulse(t: ArrayLike, fc: float, bandwidth: float = 0.5, level: float = -6.0,
+                amplitude: float = 1.0) -> NDArray[np.float64]:
     r"""A cosine under a Gaussian.
 
     .. math:: x = A e^{-k (\pi f_c t)^2} \cos 2\pi f_c t,\quad k = \frac{5 b^2}{\ln 10 \cdot L}
@@ -434,7 +445,7 @@ def gauss_pulse(t, fc, bandwidth=0.5, level=-6.0, amplitude=1.0):
     return _of_times("gauss_pulse", t, float(amplitude), 0.0, 1.0, float(fc), float(bandwidth), -float(level))
 
 
-def gauss_monopulse(t, fc, amplitude=1.0):
+def gauss_monopulse(t: ArrayLike, fc: float, amplitude: float = 1.0) -> NDArray[np.float64]:
     r"""The derivative of a Gaussian, with its peak at t = 1 / (2 pi fc).
 
     .. math:: x = 2 A \sqrt{e}\, u e^{-2u^2},\quad u = \pi f_c t
@@ -467,7 +478,8 @@ def gauss_monopulse(t, fc, amplitude=1.0):
     return core.gauss_monopulse(times.ravel(), 0, 1.0, 0.0, float(fc), float(amplitude)).reshape(times.shape)
 
 
-def triangle_pulse(t, width=1.0, skew=0.5, amplitude=1.0):
+def triangle_pulse(t: ArrayLike, width: float = 1.0, skew: float = 0.5,
+                   amplitude: float = 1.0) -> NDArray[np.float64]:
     """One triangle about t = 0.
 
     Parameters
@@ -499,7 +511,7 @@ def triangle_pulse(t, width=1.0, skew=0.5, amplitude=1.0):
     return _of_times("triangle_pulse", t, float(amplitude), 0.0, 1.0, float(width), float(skew))
 
 
-def periodic_sinc(t, order, amplitude=1.0):
+def periodic_sinc(t: ArrayLike, order: int, amplitude: float = 1.0) -> NDArray[np.float64]:
     r"""The periodic cardinal sine (Dirichlet).
 
     .. math:: x = A \frac{\sin(N t / 2)}{N \sin(t / 2)}
@@ -532,7 +544,7 @@ def periodic_sinc(t, order, amplitude=1.0):
     return _of_times("periodic_sinc", t, float(amplitude), order, 1.0, 0.0)
 
 
-def phase_modulated(x, fc, fs=1.0):
+def phase_modulated(x: ArrayLike, fc: float, fs: float = 1.0) -> NDArray[np.float64]:
     r"""A sine of frequency fc whose phase moves by x.
 
     .. math:: y_i = \sin(2\pi f_c (i + 1) / f_s + x_i)
@@ -564,7 +576,7 @@ def phase_modulated(x, fc, fs=1.0):
     return _modulated("phase_modulated", np.degrees(vector(x, "signals.phase_modulated", "x")), fc, fs)
 
 
-def frequency_modulated(x, fc, fs=1.0):
+def frequency_modulated(x: ArrayLike, fc: float, fs: float = 1.0) -> NDArray[np.float64]:
     r"""A sine whose frequency is fc + x.
 
     .. math:: y_i = \sin\Big(\frac{2\pi}{f_s} \sum_{j \le i} (f_c + x_j)\Big)
@@ -596,13 +608,13 @@ def frequency_modulated(x, fc, fs=1.0):
     return _modulated("frequency_modulated", vector(x, "signals.frequency_modulated", "x"), fc, fs)
 
 
-def _modulated(name, x, fc, fs):
+def _modulated(name: Any, x: Any, fc: Any, fs: Any) -> Any:
     if not fs > 0:
         refuse(f"signals.{name}", "fs", f"must be above 0; {fs} came", "ErrSamplingNotPositive")
     return getattr(core, name)(len(x), 1 / fs, float(fc), np.asarray(x, float), 0.0, 0.0)[1]
 
 
-def detrend(x, type="linear", axis=LAST):
+def detrend(x: ArrayLike, type: Literal["linear", "constant"] | int = "linear", axis: int = LAST) -> Any:
     """The values without their mean, line, or polynomial of least squares.
 
     Parameters
@@ -634,7 +646,7 @@ def detrend(x, type="linear", axis=LAST):
         chosen("signals.detrend", "type", type, {"linear": 1, "constant": 0})
     order = whole_number("signals.detrend", "type", order, 0, "ErrPolynomialOrderNegative")
 
-    def of_channel(channel):
+    def of_channel(channel: Any) -> Any:
         if len(channel) <= order:
             refuse("signals.detrend", "x", f"more than {order} values are needed; {len(channel)} came",
                    "ErrPolynomialOrderTooHigh")
@@ -646,7 +658,7 @@ def detrend(x, type="linear", axis=LAST):
     return along(of_channel, x, axis)
 
 
-def unwrap(x, period=2 * math.pi, axis=LAST):
+def unwrap(x: ArrayLike, period: float = 2 * math.pi, axis: int = LAST) -> Any:
     """Phases without jumps: each moved by whole periods to within half a one of its neighbour.
 
     Parameters
@@ -682,7 +694,7 @@ def unwrap(x, period=2 * math.pi, axis=LAST):
     return along(lambda channel: core.unwrap(channel * scale, 0) / scale, x, axis)
 
 
-def standardize(x, axis=LAST):
+def standardize(x: ArrayLike, axis: int = LAST) -> Any:
     """Values with the mean 0 and the standard deviation 1.
 
     Parameters
@@ -711,7 +723,7 @@ def standardize(x, axis=LAST):
     return along(lambda channel: core.standardize(channel)[0], x, axis)
 
 
-def rescale(x, low=-1.0, high=1.0, axis=LAST):
+def rescale(x: ArrayLike, low: float = -1.0, high: float = 1.0, axis: int = LAST) -> Any:
     """Values moved and stretched so that the least is low and the greatest high.
 
     Parameters
@@ -742,13 +754,13 @@ def rescale(x, low=-1.0, high=1.0, axis=LAST):
     return along(lambda channel: (core.rescale(channel)[0] + 1) * ((high - low) / 2) + low, x, axis)
 
 
-def _method(function, method, x, y):
+def _method(function: Any, method: Any, x: Any, y: Any) -> Any:
     if method == "auto":
         return int(min(len(x), len(y)) > DIRECT)
     return chosen(function, "method", method, {"auto": 1, **METHODS})
 
 
-def _part(full, mode, function, nx, ny):
+def _part(full: Any, mode: Any, function: Any, nx: Any, ny: Any) -> Any:
     """What `mode` keeps of the full result."""
     mode = chosen(function, "mode", mode, {"full": "full", "same": "same", "valid": "valid"})
     if mode == "full":
@@ -758,14 +770,15 @@ def _part(full, mode, function, nx, ny):
     return full[first:first + size]
 
 
-def _both(function, x, y):
+def _both(function: str, x: ArrayLike, y: ArrayLike) -> tuple[NDArray[Any], NDArray[Any], bool]:
     x, y = vector(x, function, "x"), vector(y, function, "y")
     if not len(x) or not len(y):
         refuse(function, "x, y", "an array is empty", "ErrEmptyInput")
     return x, y, x.dtype.kind == "c" or y.dtype.kind == "c"
 
 
-def convolve(x, y, mode="full", method="auto"):
+def convolve(x: ArrayLike, y: ArrayLike, mode: Literal["full", "same", "valid"] = "full",
+             method: Literal["auto", "direct", "fft"] = "auto") -> NDArray[Any]:
     r"""The convolution of two sequences.
 
     .. math:: z_t = \sum_i x_i y_{t-i}
@@ -801,7 +814,9 @@ def convolve(x, y, mode="full", method="auto"):
     return _part(full, mode, "signals.convolve", len(x), len(y))
 
 
-def correlate(x, y, mode="full", method="auto", normalization="none"):
+def correlate(x: ArrayLike, y: ArrayLike, mode: Literal["full", "same", "valid"] = "full",
+              method: Literal["auto", "direct", "fft"] = "auto",
+              normalization: Literal["none", "unbiased", "biased"] = "none") -> NDArray[Any]:
     r"""The cross-correlation of two sequences.
 
     .. math:: z_k = \sum_l x_l\, \overline{y_{l - k + n_y - 1}}
@@ -839,7 +854,8 @@ def correlate(x, y, mode="full", method="auto", normalization="none"):
     return _part(full, mode, "signals.correlate", len(x), len(y))
 
 
-def autocorrelate(x, normalization="none", axis=LAST):
+def autocorrelate(x: ArrayLike, normalization: Literal["none", "unbiased", "biased"] = "none",
+                  axis: int = LAST) -> NDArray[np.float64]:
     """The autocorrelation of real values, 2 n - 1 of them with lag 0 in the middle.
 
     Parameters
@@ -870,7 +886,7 @@ def autocorrelate(x, normalization="none", axis=LAST):
     return along(lambda channel: core.autocorrelate(channel, norm), x, axis)
 
 
-def deconvolve(xy, y):
+def deconvolve(xy: ArrayLike, y: ArrayLike) -> NDArray[np.float64]:
     """The sequence whose convolution with y is xy; a remainder stays in it.
 
     Parameters
@@ -899,7 +915,7 @@ def deconvolve(xy, y):
     return core.deconvolve(xy, y)
 
 
-def _matrices(function, x, y, method):
+def _matrices(function: Any, x: Any, y: Any, method: Any) -> Any:
     x, y = as_array(x), as_array(y)
     if x.ndim != 2 or y.ndim != 2:
         refuse(function, "x, y", f"two dimensions are needed; {x.ndim} and {y.ndim} came", "ErrSizesDisagree")
@@ -908,7 +924,8 @@ def _matrices(function, x, y, method):
     return x, y, chosen(function, "method", method, METHODS), "c" in x.dtype.kind + y.dtype.kind
 
 
-def convolve2(x, y, mode="full", method="auto"):
+def convolve2(x: ArrayLike, y: ArrayLike, mode: Literal["full", "same", "valid"] = "full",
+              method: Literal["auto", "direct", "fft"] = "auto") -> NDArray[Any]:
     r"""The convolution of two matrices.
 
     .. math:: z_{rc} = \sum_i \sum_j x_{ij} y_{r-i,\,c-j}
@@ -944,7 +961,7 @@ def convolve2(x, y, mode="full", method="auto"):
     return (core.convolve2_complex if is_complex else core.convolve2)(x, y, size, method)
 
 
-def correlate2(x, y, method="auto"):
+def correlate2(x: ArrayLike, y: ArrayLike, method: Literal["auto", "direct", "fft"] = "auto") -> NDArray[Any]:
     r"""The cross-correlation of two matrices, all lags; lag 0 is in the last row and column of y.
 
     .. math:: z_{rc} = \sum_i \sum_j x_{ij}\, \overline{y_{i - r + m - 1,\, j - c + n - 1}}

@@ -4,7 +4,12 @@
 M. Abramowitz and I. A. Stegun, "Handbook of mathematical functions", 1964, has the definitions.
 """
 
+from __future__ import annotations
+
+from typing import Any
+
 import numpy as np
+from numpy.typing import ArrayLike
 
 from .topical import served
 
@@ -17,7 +22,7 @@ __all__ = ["airy", "beta", "betainc", "dawsn", "digamma", "ellipe", "ellipeinc",
 core = served("special")
 
 
-def gamma(x):
+def gamma(x: ArrayLike) -> Any:
     r"""The gamma function; NaN at 0 and negative integers.
 
     .. math:: \Gamma(x) = \int_0^\infty t^{x-1} e^{-t} dt
@@ -40,7 +45,7 @@ def gamma(x):
     return core.gamma(x, 0.0, 1)
 
 
-def gammaln(x):
+def gammaln(x: ArrayLike) -> Any:
     """The logarithm of the gamma function, x at least 0.
 
     Parameters
@@ -61,7 +66,7 @@ def gammaln(x):
     return core.gammaln(x)
 
 
-def gammainc(a, x):
+def gammainc(a: ArrayLike, x: ArrayLike) -> Any:
     r"""The regularised lower incomplete gamma function.
 
     .. math:: P(a, x) = \frac{1}{\Gamma(a)} \int_0^x t^{a-1} e^{-t} dt
@@ -86,7 +91,7 @@ def gammainc(a, x):
     return core.gammainc(a, x, 0)
 
 
-def gammaincc(a, x):
+def gammaincc(a: ArrayLike, x: ArrayLike) -> Any:
     r"""The regularised upper incomplete gamma function, 1 - P(a, x).
 
     .. math:: Q(a, x) = \frac{1}{\Gamma(a)} \int_x^\infty t^{a-1} e^{-t} dt
@@ -111,7 +116,7 @@ def gammaincc(a, x):
     return core.gammaincc(a, x)
 
 
-def beta(a, b):
+def beta(a: ArrayLike, b: ArrayLike) -> Any:
     r"""The beta function.
 
     .. math:: B(a, b) = \Gamma(a) \Gamma(b) / \Gamma(a + b)
@@ -134,7 +139,7 @@ def beta(a, b):
     return core.beta(a, b, 0.0, 1)
 
 
-def betainc(a, b, x):
+def betainc(a: ArrayLike, b: ArrayLike, x: ArrayLike) -> Any:
     r"""The regularised incomplete beta function.
 
     .. math:: I_x(a, b) = \frac{1}{B(a, b)} \int_0^x t^{a-1} (1-t)^{b-1} dt
@@ -159,7 +164,7 @@ def betainc(a, b, x):
     return core.betainc(a, b, x, 0)
 
 
-def factorial(n):
+def factorial(n: ArrayLike) -> Any:
     """The factorial; infinite from 171 on.
 
     Parameters
@@ -180,7 +185,7 @@ def factorial(n):
     return core.factorial(n)
 
 
-def factorialln(n):
+def factorialln(n: ArrayLike) -> Any:
     """The logarithm of the factorial.
 
     Parameters
@@ -201,7 +206,7 @@ def factorialln(n):
     return core.factorialln(n)
 
 
-def digamma(x):
+def digamma(x: ArrayLike) -> Any:
     r"""The derivative of the logarithm of the gamma function.
 
     .. math:: \psi(x) = \Gamma'(x) / \Gamma(x)
@@ -224,7 +229,7 @@ def digamma(x):
     return core.digamma(x)
 
 
-def zeta(x):
+def zeta(x: ArrayLike) -> Any:
     r"""Riemann's zeta function and its continuation.
 
     .. math:: \zeta(x) = \sum_{k=1}^\infty k^{-x}
@@ -247,7 +252,7 @@ def zeta(x):
     return core.zeta(x)
 
 
-def stirling(x):
+def stirling(x: ArrayLike) -> Any:
     """The gamma function by Stirling's formula, for x above 33.
 
     Parameters
@@ -268,7 +273,7 @@ def stirling(x):
     return core.stirling(x)
 
 
-def erf(x):
+def erf(x: ArrayLike) -> Any:
     r"""The error function.
 
     .. math:: \mathrm{erf}\,x = \frac{2}{\sqrt\pi} \int_0^x e^{-t^2} dt
@@ -291,7 +296,7 @@ def erf(x):
     return core.erf(x)
 
 
-def erfc(x):
+def erfc(x: ArrayLike) -> Any:
     """The complementary error function, 1 - erf x without loss of digits.
 
     Parameters
@@ -312,7 +317,7 @@ def erfc(x):
     return core.erfc(x)
 
 
-def expn(n, x):
+def expn(n: ArrayLike, x: ArrayLike) -> Any:
     r"""The exponential integral.
 
     .. math:: E_n(x) = \int_1^\infty e^{-xt} t^{-n} dt
@@ -337,7 +342,7 @@ def expn(n, x):
     return core.expn(x, n)
 
 
-def sici(x):
+def sici(x: ArrayLike) -> tuple[Any, Any]:
     r"""The sine and the cosine integral.
 
     .. math:: \mathrm{Si}(x) = \int_0^x \frac{\sin t}{t} dt,\quad
@@ -361,7 +366,7 @@ def sici(x):
     return core.sici(x), core.sici_cosine(x)
 
 
-def shichi(x):
+def shichi(x: ArrayLike) -> tuple[Any, Any]:
     """The hyperbolic sine and cosine integral.
 
     Parameters
@@ -382,7 +387,7 @@ def shichi(x):
     return core.shichi(x), core.shichi_cosine(x)
 
 
-def spence(x):
+def spence(x: ArrayLike) -> Any:
     r"""The dilogarithm of 1 - x, as of `scipy.special.spence`.
 
     .. math:: \mathrm{Li}_2(1 - x) = -\int_1^x \frac{\ln t}{t - 1} dt
@@ -405,7 +410,7 @@ def spence(x):
     return core.spence(x)
 
 
-def dawsn(x):
+def dawsn(x: ArrayLike) -> Any:
     r"""Dawson's integral.
 
     .. math:: e^{-x^2} \int_0^x e^{t^2} dt
@@ -428,7 +433,7 @@ def dawsn(x):
     return core.dawsn(x)
 
 
-def fresnel(x):
+def fresnel(x: ArrayLike) -> tuple[Any, Any]:
     r"""The Fresnel integrals S and C, in this order.
 
     .. math:: S = \int_0^x \sin\frac{\pi t^2}{2} dt,\quad C = \int_0^x \cos\frac{\pi t^2}{2} dt
@@ -452,7 +457,7 @@ def fresnel(x):
     return s, c
 
 
-def ellipk(m):
+def ellipk(m: ArrayLike) -> Any:
     r"""The complete elliptic integral of the first kind by its parameter m = k^2.
 
     .. math:: K(m) = \int_0^{\pi/2} (1 - m \sin^2 t)^{-1/2} dt
@@ -475,7 +480,7 @@ def ellipk(m):
     return core.ellipk(m, 0.0, 1)
 
 
-def ellipkinc(phi, m):
+def ellipkinc(phi: ArrayLike, m: ArrayLike) -> Any:
     r"""The incomplete elliptic integral of the first kind.
 
     .. math:: F(\varphi, m) = \int_0^\varphi (1 - m \sin^2 t)^{-1/2} dt
@@ -500,7 +505,7 @@ def ellipkinc(phi, m):
     return core.ellipkinc(m, phi, 0)
 
 
-def ellipe(m):
+def ellipe(m: ArrayLike) -> Any:
     r"""The complete elliptic integral of the second kind.
 
     .. math:: E(m) = \int_0^{\pi/2} (1 - m \sin^2 t)^{1/2} dt
@@ -523,7 +528,7 @@ def ellipe(m):
     return core.ellipe(m, 0.0, 1)
 
 
-def ellipeinc(phi, m):
+def ellipeinc(phi: ArrayLike, m: ArrayLike) -> Any:
     r"""The incomplete elliptic integral of the second kind.
 
     .. math:: E(\varphi, m) = \int_0^\varphi (1 - m \sin^2 t)^{1/2} dt
@@ -548,7 +553,7 @@ def ellipeinc(phi, m):
     return core.ellipeinc(m, phi, 0)
 
 
-def ellipj(u, m):
+def ellipj(u: ArrayLike, m: ArrayLike) -> tuple[Any, Any, Any, Any]:
     """The Jacobian elliptic functions sn, cn, dn, and the amplitude.
 
     Parameters
@@ -571,7 +576,7 @@ def ellipj(u, m):
     return core.ellipj(u, m)
 
 
-def hyp2f1(a, b, c, x):
+def hyp2f1(a: ArrayLike, b: ArrayLike, c: ArrayLike, x: ArrayLike) -> Any:
     r"""Gauss's hypergeometric function, for x from -1 to 1.
 
     .. math:: {}_2F_1 = \sum_k \frac{(a)_k (b)_k}{(c)_k k!} x^k
@@ -596,7 +601,7 @@ def hyp2f1(a, b, c, x):
     return core.hyp2f1(x, a, b, c)
 
 
-def hyp1f1(a, b, x):
+def hyp1f1(a: ArrayLike, b: ArrayLike, x: ArrayLike) -> Any:
     r"""Kummer's confluent hypergeometric function.
 
     .. math:: M(a, b, x) = \sum_k \frac{(a)_k}{(b)_k k!} x^k
@@ -621,7 +626,7 @@ def hyp1f1(a, b, x):
     return core.hyp1f1(x, a, b)
 
 
-def hyperu(a, b, x):
+def hyperu(a: ArrayLike, b: ArrayLike, x: ArrayLike) -> Any:
     """Tricomi's confluent hypergeometric function.
 
     Parameters
@@ -644,7 +649,7 @@ def hyperu(a, b, x):
     return core.hyperu(x, a, b)
 
 
-def jv(v, z, scaled=False):
+def jv(v: ArrayLike, z: ArrayLike, scaled: bool = False) -> Any:
     r"""The Bessel function J of real order.
 
     .. math:: z^2 w'' + z w' + (z^2 - v^2) w = 0
@@ -678,7 +683,7 @@ def jv(v, z, scaled=False):
     return core.jv_complex(v, z, int(scaled))
 
 
-def yv(v, z, scaled=False):
+def yv(v: ArrayLike, z: ArrayLike, scaled: bool = False) -> Any:
     r"""The Bessel function Y of real order.
 
     .. math:: Y_v = \frac{J_v \cos v\pi - J_{-v}}{\sin v\pi}
@@ -712,7 +717,7 @@ def yv(v, z, scaled=False):
     return core.yv_complex(v, z, int(scaled))
 
 
-def iv(v, z, scaled=False):
+def iv(v: ArrayLike, z: ArrayLike, scaled: bool = False) -> Any:
     r"""The modified Bessel function I of real order.
 
     .. math:: z^2 w'' + z w' - (z^2 + v^2) w = 0
@@ -746,7 +751,7 @@ def iv(v, z, scaled=False):
     return core.iv_complex(v, z, int(scaled))
 
 
-def kn(n, x):
+def kn(n: ArrayLike, x: ArrayLike) -> Any:
     """The modified Bessel function K of whole order.
 
     Parameters
@@ -769,7 +774,7 @@ def kn(n, x):
     return core.kn(n, x)
 
 
-def kv(v, z, scaled=False):
+def kv(v: ArrayLike, z: ArrayLike, scaled: bool = False) -> Any:
     r"""The modified Bessel function K of real order.
 
     .. math:: K_v = \frac\pi2 \frac{I_{-v} - I_v}{\sin v\pi}
@@ -802,7 +807,7 @@ def kv(v, z, scaled=False):
     return found if np.iscomplexobj(z) or np.any(np.asarray(z) < 0) else np.asarray(found).real[()]
 
 
-def hankel1(v, z, scaled=False):
+def hankel1(v: ArrayLike, z: ArrayLike, scaled: bool = False) -> Any:
     """The Hankel function of the first kind, J + i Y.
 
     Parameters
@@ -832,7 +837,7 @@ def hankel1(v, z, scaled=False):
     return core.hankel1(v, z, int(scaled))
 
 
-def hankel2(v, z, scaled=False):
+def hankel2(v: ArrayLike, z: ArrayLike, scaled: bool = False) -> Any:
     """The Hankel function of the second kind, J - i Y.
 
     Parameters
@@ -862,7 +867,7 @@ def hankel2(v, z, scaled=False):
     return core.hankel2(v, z, int(scaled))
 
 
-def spherical_jn(n, x):
+def spherical_jn(n: ArrayLike, x: ArrayLike) -> Any:
     r"""The spherical Bessel function j.
 
     .. math:: j_n(x) = \sqrt{\pi / (2x)}\, J_{n + 1/2}(x)
@@ -887,7 +892,7 @@ def spherical_jn(n, x):
     return core.spherical_jn(n, x)
 
 
-def spherical_yn(n, x):
+def spherical_yn(n: ArrayLike, x: ArrayLike) -> Any:
     r"""The spherical Bessel function y.
 
     .. math:: y_n(x) = \sqrt{\pi / (2x)}\, Y_{n + 1/2}(x)
@@ -912,7 +917,7 @@ def spherical_yn(n, x):
     return core.spherical_yn(n, x)
 
 
-def airy(z, scaled=False):
+def airy(z: ArrayLike, scaled: bool = False) -> Any:
     r"""The Airy functions Ai, Ai', Bi, Bi'.
 
     .. math:: w'' = z w
@@ -944,7 +949,7 @@ def airy(z, scaled=False):
     return tuple(getattr(core, key)(z, int(scaled)) for key in ("airy_ai", "airy_aip", "airy_bi", "airy_bip"))
 
 
-def kelvin(n, x):
+def kelvin(n: ArrayLike, x: ArrayLike) -> tuple[Any, Any, Any, Any]:
     """The Kelvin functions ber, bei, ker, kei of whole order.
 
     Parameters
@@ -964,10 +969,11 @@ def kelvin(n, x):
     >>> [round(one, 6) for one in qx.special.kelvin(0, 1.0)]
     [0.984382, 0.249566, 0.286706, -0.494995]
     """
-    return (*core.kelvin(x, n), *core.kelvin_k(x, n))
+    (ber, bei), (ker, kei) = core.kelvin(x, n), core.kelvin_k(x, n)
+    return ber, bei, ker, kei
 
 
-def struve(v, x):
+def struve(v: ArrayLike, x: ArrayLike) -> Any:
     """The Struve function H.
 
     Parameters
@@ -990,7 +996,7 @@ def struve(v, x):
     return core.struve(x, v)
 
 
-def pbdv(v, x):
+def pbdv(v: ArrayLike, x: ArrayLike) -> Any:
     r"""The parabolic cylinder function D.
 
     .. math:: w'' = (x^2 / 4 - v - 1/2) w

@@ -5,7 +5,12 @@ Arguments have the names, order and defaults of `scipy.signal`. Segments of `npe
 window, follow each other with `noverlap` values in common.
 """
 
+from __future__ import annotations
+
+from typing import Any, Literal
+
 import numpy as np
+from numpy.typing import ArrayLike, NDArray
 
 from . import windows
 from .topical import LAST, Result, along, chosen, count_of, either, refuse, result, served, whole_number
@@ -41,8 +46,8 @@ class Spectrum(Result):
         "density" or "spectrum".
     """
 
-    frequencies: np.ndarray
-    values: np.ndarray
+    frequencies: NDArray[Any]
+    values: NDArray[Any]
     resolution: float
     segments: int
     scaling: str
@@ -50,17 +55,17 @@ class Spectrum(Result):
     _axis = -1  # of the frequencies in the values
 
     @property
-    def amplitude(self):
+    def amplitude(self) -> Any:
         """The square root of the values: unit of x by the root of that of fs for a density."""
         return np.sqrt(self.values)
 
     @property
-    def decibels(self):
+    def decibels(self) -> Any:
         """10 lg of the values."""
         with np.errstate(divide="ignore"):
             return 10 * np.log10(self.values)
 
-    def power(self, low=-np.inf, high=np.inf):
+    def power(self, low: Any = -np.inf, high: Any = np.inf) -> Any:
         """The power between two frequencies, the lines at both included: of the whole density the mean
         square of what was detrended."""
         if self.scaling != "density":
@@ -69,7 +74,7 @@ class Spectrum(Result):
         width = abs(self.frequencies[1] - self.frequencies[0]) if len(self.frequencies) > 1 else 1.0
         return np.compress(inside, self.values, self._axis).sum(self._axis) * width
 
-    def plot(self, axes=None):
+    def plot(self, axes: Any = None) -> Any:
         """Draws the values in decibels with matplotlib; returns the axes."""
         if axes is None:
             from matplotlib import pyplot
@@ -96,8 +101,8 @@ class CrossSpectrum(Result):
         How many segments were averaged.
     """
 
-    frequencies: np.ndarray
-    values: np.ndarray
+    frequencies: NDArray[Any]
+    values: NDArray[Any]
     resolution: float
     segments: int
     _unpacked = ("frequencies", "values")
@@ -121,15 +126,15 @@ class TransferFunction(Result):
         How many segments were averaged.
     """
 
-    frequencies: np.ndarray
-    values: np.ndarray
-    coherence: np.ndarray
+    frequencies: NDArray[Any]
+    values: NDArray[Any]
+    coherence: NDArray[Any]
     resolution: float
     segments: int
     _unpacked = ("frequencies", "values")
 
     @property
-    def error(self):
+    def error(self) -> Any:
         r"""The relative standard error of the magnitude,
         :math:`\sqrt{(1 - \gamma^2) / (2 n \gamma^2)}` for n independent segments (J. S. Bendat and A. G.
         Piersol, "Random data", 1971); overlapping segments count in full here."""
@@ -153,13 +158,13 @@ class Spectrogram(Result):
         The equivalent noise bandwidth of a line, in the unit of fs.
     """
 
-    frequencies: np.ndarray
-    times: np.ndarray
-    values: np.ndarray
+    frequencies: NDArray[Any]
+    times: NDArray[Any]
+    values: NDArray[Any]
     resolution: float
     _unpacked = ("frequencies", "times", "values")
 
-    def plot(self, axes=None):
+    def plot(self, axes: Any = None) -> Any:
         """Draws the values in decibels as colours with matplotlib; returns the axes."""
         if axes is None:
             from matplotlib import pyplot
@@ -173,13 +178,14 @@ class Spectrogram(Result):
 class _Segments:
     """How a signal is cut, and what a line of its spectra is worth."""
 
-    def __init__(self, function, n, fs, window, nperseg, noverlap, nfft, detrend, scaling, is_complex):
+    def __init__(self, function: Any, n: Any, fs: Any, window: Any, nperseg: Any, noverlap: Any, nfft: Any,
+                 detrend: Any, scaling: Any, is_complex: Any) -> None:
         if n < 1:
             refuse(function, "x", "is empty", "ErrEmptyInput")
         if not fs > 0:
             refuse(function, "fs", f"must be above 0; {fs} came", "ErrSamplingNotPositive")
         if nperseg is None:
-            nperseg = min(256, n) if isinstance(window, (str, tuple)) else len(window)
+            nperseg = min(256, n) if isinstance(window, (str, tuple)) else np.size(window)
         self.length = min(whole_number(function, "nperseg", nperseg, 1), n)
         noverlap = self.length // 2 if noverlap is None else whole_number(function, "noverlap", noverlap, 0)
         if noverlap >= self.length:
@@ -206,7 +212,7 @@ class _Segments:
             if self.size % 2 == 0 and self.size > 1:
                 self.scale[-1] /= 2
 
-    def _trendless(self, rows):
+    def _trendless(self, rows: Any) -> Any:
         if self.detrend is None:
             return rows
         rows = rows - rows.mean(-1, keepdims=True)
@@ -215,7 +221,7 @@ class _Segments:
             rows -= (rows @ t)[:, None] * (t / (t @ t))
         return rows
 
-    def spectra(self, x):
+    def spectra(self, x: Any) -> Any:
         """The transforms of the segments, some rows at a time."""
         x = np.ascontiguousarray(x, complex if self.is_complex else float)
         cut = np.lib.stride_tricks.sliding_window_view(x, self.length)[::self.step]
@@ -231,14 +237,14 @@ class _Segments:
                 place[:] = (sized(row, 0, self.size, 0) if padded else transform(row))[:half]
             yield found
 
-    def powers(self, x):
+    def powers(self, x: Any) -> Any:
         return np.concatenate([found.real**2 + found.imag**2 for found in self.spectra(x)])
 
-    def mean_power(self, x):
+    def mean_power(self, x: Any) -> Any:
         """The mean of the powers. Of real values two segments go through one transform, as real and
         imaginary part: its power at k and n - k is that of both together."""
         cut = np.lib.stride_tricks.sliding_window_view(x, self.length)[::self.step]
-        n, total = self.size, 0.0
+        n, total = self.size, np.zeros(self.size)
         rows_at_once = max(2, AT_ONCE // n & ~1)
         for first in range(0, len(cut), rows_at_once):
             rows = self._trendless(cut[first:first + rows_at_once]) * self.window
@@ -255,7 +261,7 @@ class _Segments:
             total = (total + np.roll(total[::-1], 1))[:len(self.frequencies)] / 2
         return total * (float(n) * n / self.count)
 
-    def sums(self, x, y):
+    def sums(self, x: Any, y: Any) -> Any:
         """The sums of |X|^2, |Y|^2 and conj(X) Y over the segments."""
         xx, yy, xy = 0.0, 0.0, 0.0
         for of_x, of_y in zip(self.spectra(x), self.spectra(y)):
@@ -266,18 +272,21 @@ class _Segments:
         return xx * factor, yy * factor, xy * factor
 
 
-def _is_complex(x):
+def _is_complex(x: Any) -> Any:
     return (x.to_numpy() if is_pandas(x) else as_array(x)).dtype.kind == "c"
 
 
-def _median_bias(n):
+def _median_bias(n: Any) -> Any:
     """The mean of the median of n values of an exponential distribution of mean 1."""
     k = 2 * np.arange(1.0, (n - 1) // 2 + 1)
     return 1 + np.sum(1 / (k + 1) - 1 / k)
 
 
-def welch(x, fs=1.0, window="hann", nperseg=None, noverlap=None, nfft=None, detrend="constant",
-          scaling="density", average="mean", axis=LAST):
+def welch(x: ArrayLike, fs: float = 1.0, window: str | tuple[Any, ...] | ArrayLike = "hann",
+          nperseg: int | None = None, noverlap: int | None = None, nfft: int | None = None,
+          detrend: Literal["constant", "linear", "none"] = "constant",
+          scaling: Literal["density", "spectrum"] = "density", average: Literal["mean", "median"] = "mean",
+          axis: int = LAST) -> Spectrum:
     r"""The density of power by the mean over overlapping segments.
 
     .. math:: P_k = \frac{2}{f_s \sum w^2} \Big\langle |X_k|^2 \Big\rangle
@@ -329,7 +338,7 @@ def welch(x, fs=1.0, window="hann", nperseg=None, noverlap=None, nfft=None, detr
     cut = _Segments("spectra.welch", count_of(x, axis), fs, window, nperseg, noverlap, nfft, detrend,
                     scaling, _is_complex(x))
 
-    def of_channel(channel):
+    def of_channel(channel: Any) -> Any:
         if average == "mean":
             return cut.mean_power(channel) * cut.scale
         powers = cut.powers(channel)
@@ -340,7 +349,9 @@ def welch(x, fs=1.0, window="hann", nperseg=None, noverlap=None, nfft=None, detr
     return found
 
 
-def periodogram(x, fs=1.0, window="boxcar", nfft=None, detrend="constant", scaling="density", axis=LAST):
+def periodogram(x: ArrayLike, fs: float = 1.0, window: str | tuple[Any, ...] | ArrayLike = "boxcar",
+                nfft: int | None = None, detrend: Literal["constant", "linear", "none"] = "constant",
+                scaling: Literal["density", "spectrum"] = "density", axis: int = LAST) -> Spectrum:
     """The density of power of all values at once: `welch` with one segment.
 
     Parameters
@@ -378,7 +389,7 @@ def periodogram(x, fs=1.0, window="boxcar", nfft=None, detrend="constant", scali
     return welch(x, fs, window, count_of(x, axis), 0, nfft, detrend, scaling, axis=axis)
 
 
-def power(x, axis=LAST):
+def power(x: ArrayLike, axis: int = LAST) -> NDArray[np.float64]:
     r"""The two-sided power spectrum without a window: :math:`|X_k|^2 / n^2`, whose sum is the mean
     square.
 
@@ -408,7 +419,8 @@ def power(x, axis=LAST):
     return either(core.power, core.power_complex, x, axis)
 
 
-def _pair(function, x, y, fs, window, nperseg, noverlap, nfft, detrend, axis):
+def _pair(function: Any, x: Any, y: Any, fs: Any, window: Any, nperseg: Any, noverlap: Any, nfft: Any,
+          detrend: Any, axis: Any) -> Any:
     """The segments of two signals and their sums, channel by channel."""
     if axis is LAST and is_pandas(x):
         axis = 0
@@ -422,7 +434,9 @@ def _pair(function, x, y, fs, window, nperseg, noverlap, nfft, detrend, axis):
     return cut, along(lambda channel: cut.sums(channel[:n], channel[n:]), both, axis)
 
 
-def csd(x, y, fs=1.0, window="hann", nperseg=None, noverlap=None, nfft=None, detrend="constant", axis=LAST):
+def csd(x: ArrayLike, y: ArrayLike, fs: float = 1.0, window: str | tuple[Any, ...] | ArrayLike = "hann",
+        nperseg: int | None = None, noverlap: int | None = None, nfft: int | None = None,
+        detrend: Literal["constant", "linear", "none"] = "constant", axis: int = LAST) -> CrossSpectrum:
     r"""The cross density of power: the mean of :math:`\overline{X_k} Y_k`, scaled as that of `welch`.
 
     Parameters
@@ -464,8 +478,11 @@ def csd(x, y, fs=1.0, window="hann", nperseg=None, noverlap=None, nfft=None, det
     return CrossSpectrum(cut.frequencies, xy, cut.resolution, cut.count)
 
 
-def transfer_function(x, y, fs=1.0, window="hann", nperseg=None, noverlap=None, nfft=None,
-                      detrend="constant", estimator="H1", axis=LAST):
+def transfer_function(x: ArrayLike, y: ArrayLike, fs: float = 1.0,
+                      window: str | tuple[Any, ...] | ArrayLike = "hann", nperseg: int | None = None,
+                      noverlap: int | None = None, nfft: int | None = None,
+                      detrend: Literal["constant", "linear", "none"] = "constant",
+                      estimator: Literal["H1", "H2"] = "H1", axis: int = LAST) -> TransferFunction:
     r"""The gain from an input x to an output y, with the coherence.
 
     .. math:: H_1 = \frac{\langle\overline{X} Y\rangle}{\langle|X|^2\rangle},\quad
@@ -520,8 +537,9 @@ def transfer_function(x, y, fs=1.0, window="hann", nperseg=None, noverlap=None, 
     return TransferFunction(cut.frequencies, values, found.real, cut.resolution, cut.count)
 
 
-def coherence(x, y, fs=1.0, window="hann", nperseg=None, noverlap=None, nfft=None, detrend="constant",
-              axis=LAST):
+def coherence(x: ArrayLike, y: ArrayLike, fs: float = 1.0, window: str | tuple[Any, ...] | ArrayLike = "hann",
+              nperseg: int | None = None, noverlap: int | None = None, nfft: int | None = None,
+              detrend: Literal["constant", "linear", "none"] = "constant", axis: int = LAST) -> Spectrum:
     """The coherence of two signals: from 0 to 1, the part of the power of one that the other explains
     linearly; unpacked, frequencies and values. With a single segment it is 1.
 
@@ -564,8 +582,10 @@ def coherence(x, y, fs=1.0, window="hann", nperseg=None, noverlap=None, nfft=Non
     return Spectrum(found.frequencies, found.coherence, found.resolution, found.segments, "coherence")
 
 
-def spectrogram(x, fs=1.0, window=("tukey", 0.25), nperseg=None, noverlap=None, nfft=None,
-                detrend="constant", scaling="density", axis=LAST):
+def spectrogram(x: ArrayLike, fs: float = 1.0, window: str | tuple[Any, ...] | ArrayLike = ("tukey", 0.25),
+                nperseg: int | None = None, noverlap: int | None = None, nfft: int | None = None,
+                detrend: Literal["constant", "linear", "none"] = "constant",
+                scaling: Literal["density", "spectrum"] = "density", axis: int = LAST) -> Spectrogram:
     """The densities of power of segments, one after the other.
 
     Parameters
@@ -607,11 +627,11 @@ def spectrogram(x, fs=1.0, window=("tukey", 0.25), nperseg=None, noverlap=None, 
     """
     n = count_of(x, axis)
     if noverlap is None:
-        length = min(256 if nperseg is None else nperseg, n) if isinstance(window, (str, tuple)) else len(window)
+        length = min(256 if nperseg is None else nperseg, n) if isinstance(window, (str, tuple)) else np.size(window)
         noverlap = int(length) // 8
     cut = _Segments("spectra.spectrogram", n, fs, window, nperseg, noverlap, nfft, detrend, scaling,
                     _is_complex(x))
-    array = x.to_numpy().T if is_pandas(x) and axis is LAST else np.moveaxis(as_array(x), axis, -1)
+    array = as_array(x).T if is_pandas(x) and axis is LAST else np.moveaxis(as_array(x), axis, -1)
     size = cut.count * len(cut.frequencies)
     flat = along(lambda channel: (cut.powers(channel) * cut.scale).T.ravel(), array)
     assert flat.shape[-1] == size
@@ -619,7 +639,7 @@ def spectrogram(x, fs=1.0, window=("tukey", 0.25), nperseg=None, noverlap=None, 
                        flat.reshape(*flat.shape[:-1], len(cut.frequencies), cut.count), cut.resolution)
 
 
-def analytic(x, axis=LAST):
+def analytic(x: ArrayLike, axis: int = LAST) -> NDArray[np.complex128]:
     """The analytic signal: x and, as imaginary part, its Hilbert transform.
 
     Parameters
@@ -647,7 +667,7 @@ def analytic(x, axis=LAST):
     return along(lambda channel: channel + 1j * core.analytic(channel), x, axis)
 
 
-def envelope(x, axis=LAST):
+def envelope(x: ArrayLike, axis: int = LAST) -> NDArray[np.float64]:
     """The envelope: the magnitude of the analytic signal, about the mean of x.
 
     Parameters
@@ -676,12 +696,12 @@ def envelope(x, axis=LAST):
     return along(lambda channel: np.abs(_about_mean(channel)), x, axis)
 
 
-def _about_mean(channel):
+def _about_mean(channel: Any) -> Any:
     found = core.analytic(channel)
     return (channel - np.mean(channel)) + 1j * found
 
 
-def instantaneous_phase(x, axis=LAST):
+def instantaneous_phase(x: ArrayLike, axis: int = LAST) -> NDArray[np.float64]:
     """The phase of the analytic signal about the mean of x, in radians, without jumps.
 
     Parameters
@@ -709,7 +729,7 @@ def instantaneous_phase(x, axis=LAST):
     return along(lambda channel: core.instantaneous_phase(np.angle(_about_mean(channel)), 0), x, axis)
 
 
-def instantaneous_frequency(x, fs=1.0, axis=LAST):
+def instantaneous_frequency(x: ArrayLike, fs: float = 1.0, axis: int = LAST) -> NDArray[np.float64]:
     """The slope of the instantaneous phase, over two intervals around each value and over one at the ends.
 
     Parameters

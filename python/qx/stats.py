@@ -4,9 +4,13 @@ Functions of samples take the last axis, not all values at once as NumPy's do; o
 columns.
 """
 
+from __future__ import annotations
+
 import math
+from typing import Any
 
 import numpy as np
+from numpy.typing import ArrayLike, NDArray
 
 from .topical import LAST, Result, Stream, along, either, refuse, result, served, whole_number
 from .topical.axes import as_array
@@ -32,9 +36,9 @@ class Histogram(Result):
         The centres of the bins.
     """
 
-    counts: np.ndarray
-    edges: np.ndarray
-    centres: np.ndarray
+    counts: NDArray[Any]
+    edges: NDArray[Any]
+    centres: NDArray[Any]
     _unpacked = ("counts", "edges")
 
 
@@ -54,7 +58,7 @@ class Test(Result):
 
     statistic: float
     p: float
-    dof: tuple
+    dof: tuple[int, ...]
     _unpacked = ("statistic", "p")
 
 
@@ -80,25 +84,25 @@ class Anova(Result):
         What f exceeds by chance with the probability `significance`.
     """
 
-    sources: tuple
-    sums: np.ndarray
-    dof: np.ndarray
-    means: np.ndarray
-    f: np.ndarray
-    p: np.ndarray
-    critical: np.ndarray
+    sources: tuple[str, ...]
+    sums: NDArray[Any]
+    dof: NDArray[Any]
+    means: NDArray[Any]
+    f: NDArray[Any]
+    p: NDArray[Any]
+    critical: NDArray[Any]
 
-    def _rows(self):
-        def text(value):
+    def _rows(self) -> Any:
+        def text(value: Any) -> Any:
             return "" if np.isnan(value) else f"{value:.6g}"
         yield "Anova", "sum", "dof", "mean", "F", "p", "critical F"
         for row in zip(self.sources, self.sums, self.dof, self.means, self.f, self.p, self.critical):
             yield row[0], *map(text, row[1:])
 
-    def __repr__(self):
+    def __repr__(self) -> str:
         return "\n".join(row[0].ljust(8) + "".join(cell.rjust(13) for cell in row[1:]) for row in self._rows())
 
-    def _repr_html_(self):
+    def _repr_html_(self) -> str:
         rows = "".join("<tr>" + "".join(f"<td>{cell}</td>" for cell in row) + "</tr>" for row in self._rows())
         return f"<table>{rows}</table>"
 
@@ -114,28 +118,28 @@ class Distribution:
     0.95
     """
 
-    def __init__(self, name, parameters):
+    def __init__(self, name: Any, parameters: Any) -> None:
         self.name, self.parameters = name, parameters
 
-    def _call(self, kind, x, dof):
+    def _call(self, kind: Any, x: Any, dof: Any) -> Any:
         if len(dof) != len(self.parameters):
             refuse(f"stats.{self.name}", ", ".join(self.parameters) or "dof",
                    f"{len(self.parameters)} are needed; {len(dof)} came", "ErrTooFewForParameters")
         return np.asarray(getattr(core, f"{self.name}_{kind}")(x, *dof))[()]
 
-    def cdf(self, x, *dof):
+    def cdf(self, x: Any, *dof: Any) -> Any:
         """The probability of a value of at most x."""
         return self._call("cdf", x, dof)
 
-    def sf(self, x, *dof):
+    def sf(self, x: Any, *dof: Any) -> Any:
         """The probability of a value above x, 1 - cdf."""
         return 1 - self.cdf(x, *dof)
 
-    def ppf(self, p, *dof):
+    def ppf(self, p: Any, *dof: Any) -> Any:
         """The quantile: the value that is not exceeded with probability p."""
         return self._call("ppf", p, dof)
 
-    def __repr__(self):
+    def __repr__(self) -> str:
         return f"Distribution {self.name}({', '.join(self.parameters)})"
 
 
@@ -145,7 +149,7 @@ chi2 = Distribution("chi2", ("dof",))
 f = Distribution("f", ("n", "d"))
 
 
-def mean(x, axis=LAST):
+def mean(x: ArrayLike, axis: int = LAST) -> Any:
     """The arithmetic mean.
 
     Parameters
@@ -173,7 +177,7 @@ def mean(x, axis=LAST):
     return along(core.mean, x, axis)
 
 
-def rms(x, axis=LAST):
+def rms(x: ArrayLike, axis: int = LAST) -> Any:
     """The root of the mean square, of real or complex values.
 
     Parameters
@@ -201,7 +205,7 @@ def rms(x, axis=LAST):
     return either(core.rms, core.rms_complex, x, axis)
 
 
-def moment(x, order, axis=LAST):
+def moment(x: ArrayLike, order: int, axis: int = LAST) -> Any:
     r"""The central moment.
 
     .. math:: \frac1n \sum_i (x_i - \bar x)^m
@@ -234,7 +238,7 @@ def moment(x, order, axis=LAST):
     return along(lambda channel: core.moment(channel, order), x, axis)
 
 
-def var(x, axis=LAST, ddof=0):
+def var(x: ArrayLike, axis: int = LAST, ddof: int = 0) -> Any:
     """The variance.
 
     Parameters
@@ -261,7 +265,7 @@ def var(x, axis=LAST, ddof=0):
     >>> qx.stats.var([1.0, 2.0, 6.0], ddof=1)
     7.0
     """
-    def of_channel(channel):
+    def of_channel(channel: Any) -> Any:
         n = len(channel)
         if n and n <= ddof:
             refuse("stats.var", "ddof", f"must be below the number of values, {n}; {ddof} came", "ErrSizesDisagree")
@@ -270,7 +274,7 @@ def var(x, axis=LAST, ddof=0):
     return along(of_channel, x, axis)
 
 
-def std(x, axis=LAST, ddof=0):
+def std(x: ArrayLike, axis: int = LAST, ddof: int = 0) -> Any:
     """The standard deviation, the root of the variance.
 
     Parameters
@@ -300,7 +304,7 @@ def std(x, axis=LAST, ddof=0):
     return np.sqrt(var(x, axis, ddof))
 
 
-def skew(x, axis=LAST):
+def skew(x: ArrayLike, axis: int = LAST) -> Any:
     """The skewness: the third central moment by the power 3/2 of the second.
 
     Parameters
@@ -328,7 +332,7 @@ def skew(x, axis=LAST):
     return along(lambda channel: core.moment(channel, 3) / core.moment(channel, 2)**1.5, x, axis)
 
 
-def kurtosis(x, axis=LAST, fisher=True):
+def kurtosis(x: ArrayLike, axis: int = LAST, fisher: bool = True) -> Any:
     """The kurtosis: the fourth central moment by the square of the second.
 
     Parameters
@@ -358,7 +362,7 @@ def kurtosis(x, axis=LAST, fisher=True):
     return along(lambda channel: core.moment(channel, 4) / core.moment(channel, 2)**2, x, axis) - 3 * bool(fisher)
 
 
-def median(x, axis=LAST):
+def median(x: ArrayLike, axis: int = LAST) -> Any:
     """The median.
 
     Parameters
@@ -386,7 +390,7 @@ def median(x, axis=LAST):
     return along(core.median, x, axis)
 
 
-def mode(x, intervals=0):
+def mode(x: ArrayLike, intervals: int = 0) -> NDArray[np.float64]:
     """The most frequent values, rising.
 
     Parameters
@@ -415,7 +419,7 @@ def mode(x, intervals=0):
     return core.mode(as_array(x).ravel(), whole_number("stats.mode", "intervals", intervals, 0))
 
 
-def mse(x, y):
+def mse(x: ArrayLike, y: ArrayLike) -> float:
     """The mean square of the differences.
 
     Parameters
@@ -444,7 +448,7 @@ def mse(x, y):
     return core.mse(x, y)
 
 
-def histogram(x, bins=10):
+def histogram(x: ArrayLike, bins: ArrayLike = 10) -> Histogram:
     """Counts in bins of equal width from the least to the greatest value, or in bins of one's own.
 
     Parameters
@@ -482,7 +486,7 @@ def histogram(x, bins=10):
     return Histogram(core.histogram_intervals(x, intervals)[0], edges, (edges[1:] + edges[:-1]) / 2)
 
 
-def contingency(table):
+def contingency(table: ArrayLike) -> Test:
     r"""Pearson's test of independence on a table of counts.
 
     .. math:: \chi^2 = \sum (O - E)^2 / E
@@ -512,7 +516,7 @@ def contingency(table):
     return Test(statistic, p, ((table.shape[0] - 1) * (table.shape[1] - 1),))
 
 
-def anova(*samples, significance=0.05):
+def anova(*samples: ArrayLike, significance: float = 0.05) -> Anova:
     """The analysis of variance of samples of one factor: whether their means differ.
 
     Parameters
@@ -548,7 +552,7 @@ def anova(*samples, significance=0.05):
                  np.array([critical, nan, nan]))
 
 
-def _coded(function, y, labels, random):
+def _coded(function: Any, y: Any, labels: Any, random: Any) -> Any:
     """y, the labels as numbers, and the counts of levels, negative for random factors as the exports have
     them."""
     y = as_array(y).astype(float).ravel()
@@ -560,23 +564,24 @@ def _coded(function, y, labels, random):
                    "ErrSizeMismatch")
         codes.append(code.astype(np.int32))
         levels.append(-len(found) if is_random else len(found))
-    cells = math.prod(map(abs, levels))
+    cells = math.prod(abs(level) for level in levels)
     if not cells or len(y) % cells:
         refuse(function, "y", f"must have as many values in each of the {cells} cells; {len(y)} came",
                "ErrAnovaCountMismatch")
     return y, codes, levels, len(y) // cells
 
 
-def _table(sources, found):
+def _table(sources: Any, found: Any) -> Any:
     parts = [np.asarray(part, float) for part in (*found[:5], found[6])]
 
-    def whole(part):
+    def whole(part: Any) -> Any:
         return np.concatenate([part, np.full(len(sources) - len(part), math.nan)])
 
     return Anova(sources, *map(whole, parts))
 
 
-def anova2(y, a, b, random=(False, False), significance=0.05):
+def anova2(y: ArrayLike, a: ArrayLike, b: ArrayLike, random: tuple[bool, bool] = (False, False),
+           significance: float = 0.05) -> Anova:
     """The analysis of variance of two factors, with as many values in each cell.
 
     Parameters
@@ -611,7 +616,8 @@ def anova2(y, a, b, random=(False, False), significance=0.05):
     return _table(("A", "B", "AB", "error", "total"), core.anova2(y, *codes, *levels, count, float(significance)))
 
 
-def anova3(y, a, b, c, random=(False, False, False), significance=0.05):
+def anova3(y: ArrayLike, a: ArrayLike, b: ArrayLike, c: ArrayLike,
+           random: tuple[bool, bool, bool] = (False, False, False), significance: float = 0.05) -> Anova:
     """The analysis of variance of three factors, with as many values in each cell.
 
     Parameters
@@ -689,14 +695,14 @@ class Running(Stream):
 
     dtypes = (np.dtype(float),)
 
-    def __init__(self, channels=None, axis=-1):
+    def __init__(self, channels: int | None = None, axis: int = -1) -> None:
         super().__init__(channels, axis)
 
-    def _start(self):
+    def _start(self) -> Any:
         """Count, first value, sums of differences from it and of their squares, least, greatest."""
         return 0, 0.0, 0.0, 0.0, math.inf, -math.inf
 
-    def _step(self, state, block):
+    def _step(self, state: Any, block: Any) -> Any:
         count, first, total, squares, least, greatest = state
         first = first if count else float(block[0])
         away = block - first
@@ -706,11 +712,11 @@ class Running(Stream):
         return np.empty(0), (count + len(block), first, total, squares, min(least, float(block.min())),
                              max(greatest, float(block.max())))
 
-    def __call__(self, block):
+    def __call__(self, block: Any) -> Any:
         super().__call__(block)
         return self.summary()
 
-    def summary(self):
+    def summary(self) -> Any:
         """The Summary so far; NaN where there was no value."""
         parts = []
         for count, first, total, squares, least, greatest in self._states:
@@ -718,12 +724,12 @@ class Running(Stream):
             mean, variance = first + total / n, max(squares / n - (total / n)**2, 0.0) if count else math.nan
             parts.append((mean, math.sqrt(variance) if count else math.nan,
                           math.sqrt(variance + mean * mean) if count else math.nan, least, greatest))
-        columns = [np.array(column) for column in zip(*parts)]
+        columns: list[Any] = [np.array(column) for column in zip(*parts)]
         if self.channels is None:
             columns = [float(column[0]) for column in columns]
         return Summary(self._states[0][0], *columns)
 
-    def finish(self):
+    def finish(self) -> Any:
         """The Summary of all; begins anew."""
         found = self.summary()
         self.reset()

@@ -9,7 +9,12 @@ F. J. Harris, "On the use of windows for harmonic analysis with the discrete Fou
 defines most of them.
 """
 
+from __future__ import annotations
+
+from typing import Any
+
 import numpy as np
+from numpy.typing import ArrayLike, NDArray
 
 from .topical import LAST, Result, chosen, either, refuse, result, served, vector, whole_number
 
@@ -34,7 +39,7 @@ DEFAULTS = {"tukey": 0.5, "chebyshev": 60.0, "force": 50.0, "exponential": 0.1}
 ONE_FORM = ("force", "exponential")  # neither symmetric nor periodic
 
 
-def _described(window):
+def _described(window: Any) -> Any:
     """The name of a window that is given by a word, or by a word with a parameter, and the parameter."""
     word, *parameters = window if isinstance(window, tuple) else (window,)
     name = chosen("windows.get", "window", word, WORDS)
@@ -47,7 +52,7 @@ def _described(window):
     return name, float(parameters[0] if parameters else DEFAULTS[name])
 
 
-def _windowed(call, x, name, parameter, symmetric):
+def _windowed(call: Any, x: Any, name: Any, parameter: Any, symmetric: Any) -> Any:
     """x times a window."""
     n = len(x)
     code = PLAIN.get(name, WITH_PARAMETER.get(name))
@@ -63,7 +68,7 @@ def _windowed(call, x, name, parameter, symmetric):
     return call(x, code, parameter, 0, int(symmetric and name not in ONE_FORM))
 
 
-def get(window, n, symmetric=False):
+def get(window: str | tuple[Any, ...] | ArrayLike, n: int, symmetric: bool = False) -> NDArray[np.float64]:
     """A window by its name.
 
     Parameters
@@ -101,7 +106,7 @@ def get(window, n, symmetric=False):
     return _windowed(core.get, np.ones(n), name, parameter, symmetric)
 
 
-def apply(x, window, axis=LAST, symmetric=False):
+def apply(x: ArrayLike, window: str | tuple[Any, ...], axis: int = LAST, symmetric: bool = False) -> Any:
     """Values times a window.
 
     Parameters
@@ -153,7 +158,7 @@ class Constants(Result):
     coherent_gain: float
 
 
-def constants(window, n=1024):
+def constants(window: str | tuple[Any, ...] | ArrayLike, n: int = 1024) -> Constants:
     r"""Equivalent noise bandwidth and coherent gain of a window.
 
     .. math:: \mathrm{ENBW} = n \frac{\sum w_i^2}{(\sum w_i)^2},\quad
@@ -189,7 +194,7 @@ def constants(window, n=1024):
     return Constants(found["enbw"], found["cg"])
 
 
-def cosine_sum(n, coefficients, symmetric=True):
+def cosine_sum(n: int, coefficients: ArrayLike, symmetric: bool = True) -> NDArray[np.float64]:
     r"""A window as a sum of cosines of one's own.
 
     .. math:: w_i = \sum_k (-1)^k a_k \cos\frac{2\pi k i}{n - 1}
@@ -227,7 +232,7 @@ def cosine_sum(n, coefficients, symmetric=True):
     return np.append(half, half[0])
 
 
-def boxcar(n, symmetric=True):
+def boxcar(n: int, symmetric: bool = True) -> NDArray[np.float64]:
     r"""A window: the rectangle: all ones.
 
     .. math:: w_i = 1
@@ -257,7 +262,7 @@ def boxcar(n, symmetric=True):
     return get("boxcar", n, symmetric)
 
 
-def hann(n, symmetric=True):
+def hann(n: int, symmetric: bool = True) -> NDArray[np.float64]:
     r"""A window: the raised cosine.
 
     .. math:: w_i = \frac12 - \frac12 \cos\theta_i
@@ -289,7 +294,7 @@ def hann(n, symmetric=True):
     return get("hann", n, symmetric)
 
 
-def hamming(n, symmetric=True):
+def hamming(n: int, symmetric: bool = True) -> NDArray[np.float64]:
     r"""A window: the raised cosine on a pedestal, with a low first side lobe.
 
     .. math:: w_i = 0.54 - 0.46 \cos\theta_i
@@ -321,7 +326,7 @@ def hamming(n, symmetric=True):
     return get("hamming", n, symmetric)
 
 
-def blackman(n, symmetric=True):
+def blackman(n: int, symmetric: bool = True) -> NDArray[np.float64]:
     r"""A window: three terms.
 
     .. math:: w_i = 0.42 - 0.5 \cos\theta_i + 0.08 \cos 2\theta_i
@@ -353,7 +358,7 @@ def blackman(n, symmetric=True):
     return get("blackman", n, symmetric)
 
 
-def blackman_exact(n, symmetric=True):
+def blackman_exact(n: int, symmetric: bool = True) -> NDArray[np.float64]:
     r"""A window: three terms, with zeros on the third and fourth side lobe.
 
     .. math:: w_i = \tfrac{7938}{18608} - \tfrac{9240}{18608} \cos\theta_i + \tfrac{1430}{18608} \cos 2\theta_i
@@ -385,7 +390,7 @@ def blackman_exact(n, symmetric=True):
     return get("blackman_exact", n, symmetric)
 
 
-def blackman_harris3(n, symmetric=True):
+def blackman_harris3(n: int, symmetric: bool = True) -> NDArray[np.float64]:
     r"""A window: three terms, side lobes 67 dB down.
 
     .. math:: w_i = 0.42323 - 0.49755 \cos\theta_i + 0.07922 \cos 2\theta_i
@@ -417,7 +422,7 @@ def blackman_harris3(n, symmetric=True):
     return get("blackman_harris3", n, symmetric)
 
 
-def blackman_harris(n, symmetric=True):
+def blackman_harris(n: int, symmetric: bool = True) -> NDArray[np.float64]:
     r"""A window: four terms, side lobes 92 dB down.
 
     .. math:: w_i = 0.35875 - 0.48829 \cos\theta_i + 0.14128 \cos 2\theta_i - 0.01168 \cos 3\theta_i
@@ -449,7 +454,7 @@ def blackman_harris(n, symmetric=True):
     return get("blackman_harris", n, symmetric)
 
 
-def blackman_harris7(n, symmetric=True):
+def blackman_harris7(n: int, symmetric: bool = True) -> NDArray[np.float64]:
     r"""A window: seven terms, side lobes more than 160 dB down.
 
     .. math:: w_i = \sum_{k=0}^{6} (-1)^k a_k \cos k\theta_i
@@ -481,7 +486,7 @@ def blackman_harris7(n, symmetric=True):
     return get("blackman_harris7", n, symmetric)
 
 
-def blackman_nuttall(n, symmetric=True):
+def blackman_nuttall(n: int, symmetric: bool = True) -> NDArray[np.float64]:
     r"""A window: four terms, side lobes 98 dB down.
 
     .. math:: w_i = 0.3635819 - 0.4891775 \cos\theta_i + 0.1365995 \cos 2\theta_i - 0.0106411 \cos 3\theta_i
@@ -513,7 +518,7 @@ def blackman_nuttall(n, symmetric=True):
     return get("blackman_nuttall", n, symmetric)
 
 
-def flattop(n, symmetric=True):
+def flattop(n: int, symmetric: bool = True) -> NDArray[np.float64]:
     r"""A window: five terms with a flat top: the amplitude of a tone between bins is read right.
 
     .. math:: w_i = \sum_{k=0}^{4} (-1)^k a_k \cos k\theta_i
@@ -545,7 +550,7 @@ def flattop(n, symmetric=True):
     return get("flattop", n, symmetric)
 
 
-def low_sidelobe(n, symmetric=True):
+def low_sidelobe(n: int, symmetric: bool = True) -> NDArray[np.float64]:
     r"""A window: five terms with low side lobes.
 
     .. math:: w_i = \sum_{k=0}^{4} (-1)^k a_k \cos k\theta_i
@@ -577,7 +582,7 @@ def low_sidelobe(n, symmetric=True):
     return get("low_sidelobe", n, symmetric)
 
 
-def triangle(n, symmetric=True):
+def triangle(n: int, symmetric: bool = True) -> NDArray[np.float64]:
     r"""A window: the triangle with zeros at the ends (Bartlett).
 
     .. math:: w_i = 1 - |u_i|
@@ -609,7 +614,7 @@ def triangle(n, symmetric=True):
     return get("triangle", n, symmetric)
 
 
-def bartlett_hann(n, symmetric=True):
+def bartlett_hann(n: int, symmetric: bool = True) -> NDArray[np.float64]:
     r"""A window: triangle and cosine.
 
     .. math:: w_i = 0.62 - 0.24 |u_i| + 0.38 \cos \pi u_i
@@ -641,7 +646,7 @@ def bartlett_hann(n, symmetric=True):
     return get("bartlett_hann", n, symmetric)
 
 
-def bohman(n, symmetric=True):
+def bohman(n: int, symmetric: bool = True) -> NDArray[np.float64]:
     r"""A window: two half cosines, convolved.
 
     .. math:: w_i = (1 - |u_i|) \cos \pi |u_i| + \tfrac1\pi \sin \pi |u_i|
@@ -673,7 +678,7 @@ def bohman(n, symmetric=True):
     return get("bohman", n, symmetric)
 
 
-def parzen(n, symmetric=True):
+def parzen(n: int, symmetric: bool = True) -> NDArray[np.float64]:
     r"""A window: a cubic spline.
 
     .. math:: w_i = 1 - 6 u_i^2 + 6 |u_i|^3\ (|u_i| \le \tfrac12),\quad 2 (1 - |u_i|)^3
@@ -705,7 +710,7 @@ def parzen(n, symmetric=True):
     return get("parzen", n, symmetric)
 
 
-def welch(n, symmetric=True):
+def welch(n: int, symmetric: bool = True) -> NDArray[np.float64]:
     r"""A window: the parabola.
 
     .. math:: w_i = 1 - u_i^2
@@ -737,7 +742,7 @@ def welch(n, symmetric=True):
     return get("welch", n, symmetric)
 
 
-def kaiser(n, beta, symmetric=True):
+def kaiser(n: int, beta: float, symmetric: bool = True) -> NDArray[np.float64]:
     r"""The window of Kaiser, near the best energy in the main lobe.
 
     .. math:: w_i = \frac{I_0(\beta \sqrt{1 - u_i^2})}{I_0(\beta)}
@@ -773,7 +778,7 @@ def kaiser(n, beta, symmetric=True):
     return get(("kaiser", beta), n, symmetric)
 
 
-def chebyshev(n, attenuation=60.0, symmetric=True):
+def chebyshev(n: int, attenuation: float = 60.0, symmetric: bool = True) -> NDArray[np.float64]:
     r"""The window of Dolph and Chebyshev, with the narrowest main lobe for side lobes that are down by as much.
 
     Parameters
@@ -803,7 +808,7 @@ def chebyshev(n, attenuation=60.0, symmetric=True):
     return get(("chebyshev", attenuation), n, symmetric)
 
 
-def gaussian(n, std, symmetric=True):
+def gaussian(n: int, std: float, symmetric: bool = True) -> NDArray[np.float64]:
     r"""A window: the bell curve.
 
     .. math:: w_i = e^{-(i - (n-1)/2)^2 / (2 \sigma^2)}
@@ -835,7 +840,7 @@ def gaussian(n, std, symmetric=True):
     return get(("gaussian", std), n, symmetric)
 
 
-def tukey(n, alpha=0.5, symmetric=True):
+def tukey(n: int, alpha: float = 0.5, symmetric: bool = True) -> NDArray[np.float64]:
     r"""A window: a rectangle with cosine tapers at both ends.
 
     .. math:: w_i = \sin^2\frac{\pi i}{2m},\quad m = \lfloor \alpha n / 2 \rfloor
@@ -869,7 +874,7 @@ def tukey(n, alpha=0.5, symmetric=True):
     return get(("tukey", alpha), n, symmetric)
 
 
-def force(n, percent=50.0):
+def force(n: int, percent: float = 50.0) -> NDArray[np.float64]:
     """A window: ones at the beginning, zeros behind: for the force of a hammer.
 
     Parameters
@@ -897,7 +902,7 @@ def force(n, percent=50.0):
     return get(("force", percent), n)
 
 
-def exponential(n, final=0.1):
+def exponential(n: int, final: float = 0.1) -> NDArray[np.float64]:
     """A window: an exponential from 1 at the first value to `final` at the last: for vibrations that die away.
 
     Parameters

@@ -162,7 +162,7 @@ class Axes(unittest.TestCase):
                 qx.fft.fft(x, axis=axis)
         with self.assertRaisesRegex(ValueError, "1 elements are masked"):
             qx.fft.fft(np.ma.masked_equal([1.0, 2.0], 2.0))
-        self.assertEqual(repr(inspect.signature(qx.fft.rfft).parameters["axis"]), "<Parameter \"axis=-1\">")
+        self.assertEqual(repr(inspect.signature(qx.fft.rfft).parameters["axis"].default), "-1")
         self.assertIs(pickle.loads(pickle.dumps(LAST)), LAST)
 
 

@@ -23,7 +23,7 @@ How to write one:
 
 from .axes import LAST, along, count_of, either, vector
 from .newest import TOPICS, served
-from .results import Result, result
+from .results import Result as Result, result as result
 from .streams import Stream
 from .words import chosen, refuse, whole_number
 

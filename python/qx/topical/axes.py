@@ -5,13 +5,20 @@ so its bits are those that it has alone. Where there is enough to do, channels r
 side while the exports work.
 """
 
+from __future__ import annotations
+
 import os
 import threading
 from concurrent.futures import ThreadPoolExecutor
+from collections.abc import Callable, Sequence
+from typing import Any
 
 import numpy as np
+from numpy.typing import ArrayLike, NDArray
 
 from ..outcomes import keeping, warn
+
+Channel = Callable[[NDArray[Any]], Any]  # a function of one channel
 
 ENOUGH = 1 << 15  # elements from which on threads are worth their while
 
@@ -19,10 +26,10 @@ ENOUGH = 1 << 15  # elements from which on threads are worth their while
 class _Last(int):
     """The default axis: the last one, and the rows of a pandas table, whose columns are channels."""
 
-    def __repr__(self):
+    def __repr__(self) -> str:
         return "-1"
 
-    def __reduce__(self):
+    def __reduce__(self) -> str:
         return "LAST"
 
 
@@ -32,17 +39,21 @@ LAST = _Last(-1)
 class _Workers:
     """The threads, made when they are first needed; a forked process makes its own."""
 
-    def __init__(self):
-        self.pool, self.lock, self.here = None, threading.Lock(), threading.local()
+    def __init__(self) -> None:
+        self.begin()
 
-    def is_one(self):
+    def begin(self) -> None:
+        self.pool: ThreadPoolExecutor | None = None
+        self.lock, self.here = threading.Lock(), threading.local()
+
+    def is_one(self) -> bool:
         """Whether this thread is one of them, which must not wait for the others."""
-        return getattr(self.here, "is_worker", False)
+        return bool(getattr(self.here, "is_worker", False))
 
-    def _begin(self):
+    def _begin(self) -> None:
         self.here.is_worker = True
 
-    def get(self):
+    def get(self) -> ThreadPoolExecutor:
         with self.lock:
             if self.pool is None:
                 self.pool = ThreadPoolExecutor(processors(), "qx", self._begin)
@@ -51,15 +62,15 @@ class _Workers:
 
 _workers = _Workers()
 if hasattr(os, "register_at_fork"):
-    os.register_at_fork(after_in_child=_workers.__init__)
+    os.register_at_fork(after_in_child=_workers.begin)
 
 
-def processors():
+def processors() -> int:
     """How many processors this process may use."""
     return len(os.sched_getaffinity(0)) if hasattr(os, "sched_getaffinity") else os.cpu_count() or 1
 
 
-def many(function, channels, size):
+def many(function: Callable[[Any], Any], channels: Sequence[Any] | NDArray[Any], size: int) -> list[Any]:
     """The results of the function for each of the channels, in order; `size` elements in all."""
     if len(channels) < 2 or size < ENOUGH or processors() < 2 or _workers.is_one():
         return [function(channel) for channel in channels]
@@ -70,18 +81,18 @@ def many(function, channels, size):
     return [found for found, _ in done]
 
 
-def is_pandas(x):
+def is_pandas(x: object) -> bool:
     return type(x).__module__.partition(".")[0] == "pandas" and hasattr(x, "iloc")
 
 
-def as_array(x):
+def as_array(x: ArrayLike) -> NDArray[Any]:
     """x as an array of numbers; masked values are refused, since no export knows of a mask."""
     if isinstance(x, np.ma.MaskedArray) and np.ma.is_masked(x):
         raise ValueError(f"{np.ma.count_masked(x)} elements are masked: fill or compress the array")
     return np.asarray(x)
 
 
-def vector(x, function, argument):
+def vector(x: ArrayLike, function: str, argument: str) -> NDArray[Any]:
     """x as an array of one dimension, for what has no axis."""
     array = as_array(x)
     if array.ndim != 1:
@@ -89,7 +100,7 @@ def vector(x, function, argument):
     return array
 
 
-def along(function, x, axis=LAST):
+def along(function: Channel, x: ArrayLike, axis: int = LAST) -> Any:
     """The function of one channel over all channels of x, which are along the axis.
 
     What the function returns takes the channel's place: an array of any length, a number (the axis
@@ -102,7 +113,7 @@ def along(function, x, axis=LAST):
     return _along(function, as_array(x), axis)
 
 
-def _along(function, x, axis):
+def _along(function: Channel, x: NDArray[Any], axis: int) -> Any:
     if x.ndim == 0:
         raise ValueError("an array of at least one dimension is needed; a single number came")
     if not -x.ndim <= axis < x.ndim:
@@ -120,7 +131,7 @@ def _along(function, x, axis):
     return _together(found, moved.shape[:-1], place)
 
 
-def _together(parts, shape, place):
+def _together(parts: Sequence[Any], shape: tuple[int, ...], place: int) -> NDArray[Any]:
     """The results of all channels as one array, with the channel's results along the axis `place`."""
     first = np.asarray(parts[0])
     if any(np.shape(part) != first.shape for part in parts):
@@ -131,7 +142,7 @@ def _together(parts, shape, place):
     return np.moveaxis(together, -1, place) if first.ndim == 1 else together
 
 
-def either(real, of_complex, x, axis=LAST):
+def either(real: Channel, of_complex: Channel, x: Any, axis: int = LAST) -> Any:
     """along(), with the function for real or for complex channels as x is the one or the other."""
     if type(x) is np.ndarray and x.ndim == 1 and axis is LAST:
         return of_complex(x) if x.dtype.kind == "c" else real(x)
@@ -141,7 +152,7 @@ def either(real, of_complex, x, axis=LAST):
     return along(of_complex if kind == "c" else real, x, axis)
 
 
-def count_of(x, axis=LAST):
+def count_of(x: ArrayLike, axis: int = LAST) -> int:
     """How many values a channel has."""
     shape = np.shape(x)
     if not shape:
@@ -151,7 +162,7 @@ def count_of(x, axis=LAST):
 
 # pandas
 
-def _of_pandas(function, x, axis):
+def _of_pandas(function: Channel, x: Any, axis: int) -> Any:
     """Series and tables: their index stays where as many values come back, their columns always."""
     place = 0 if axis is LAST else axis % x.ndim
     found = _along(function, as_array(x.to_numpy()), place)
@@ -160,7 +171,7 @@ def _of_pandas(function, x, axis):
     return _dressed(found, x, place)
 
 
-def _dressed(values, x, place):
+def _dressed(values: Any, x: Any, place: int) -> Any:
     import pandas
     if np.ndim(values) == 0:
         return values

@@ -3,8 +3,12 @@
 A key is the name of a topic's function or class, or begins with it and an underscore (`fft_real`).
 """
 
+from __future__ import annotations
+
 import difflib
 import importlib
+from collections.abc import Iterable
+from typing import Any
 
 from ..calls import export, hint
 from ..library import library
@@ -189,10 +193,10 @@ NEWEST = {
 class Served:
     """The exports of a topic by the keys of the table; each is written at its first use."""
 
-    def __init__(self, topic):
+    def __init__(self, topic: str) -> None:
         self._topic = topic
 
-    def __getattr__(self, key):
+    def __getattr__(self, key: str) -> Any:
         try:
             name = NEWEST[self._topic][key]
         except KeyError:
@@ -202,11 +206,11 @@ class Served:
         return function
 
 
-def served(topic):
+def served(topic: str) -> Served:
     return Served(topic)
 
 
-def function_of(topic, key):
+def function_of(topic: Any, key: str) -> Any:
     """The public function or class that a key of the table belongs to."""
     public = importlib.import_module(f"..{topic}", __package__).__all__
     fitting = [name for name in public if key == name or key.startswith(f"{name}_")]
@@ -215,7 +219,7 @@ def function_of(topic, key):
     return max(fitting, key=len)
 
 
-def public_names():
+def public_names() -> dict[str, list[str]]:
     """Where the public names of all topics are: name to topics."""
     found = {}
     for topic in TOPICS:
@@ -224,7 +228,7 @@ def public_names():
     return found
 
 
-def answer(name, more=()):
+def answer(name: str, more: Iterable[str] = ()) -> str:
     """Where a name is that somebody looked for in another place, as the end of a message."""
     places = public_names()
     lower = {known.lower(): known for known in places}

@@ -1,42 +1,47 @@
 """Results of several parts, shown in words and as a table in notebooks."""
 
+from __future__ import annotations
+
 import dataclasses
 import html
+from collections.abc import Iterator
+from typing import TYPE_CHECKING, Any, ClassVar
 
 import numpy as np
+
 
 
 class Result:
     """Base of results: shown line by line, unpacked as a tuple of the fields that `_unpacked` names,
     or of all."""
 
-    _unpacked: tuple = ()
+    _unpacked: ClassVar[tuple[str, ...]] = ()
 
-    def _shown(self):
+    def _shown(self) -> list[tuple[str, str]]:
         """Names and texts of what is shown."""
         return [(field.name, _text(getattr(self, field.name))) for field in dataclasses.fields(self)
                 if field.repr]
 
-    def __repr__(self):
+    def __repr__(self) -> str:
         rows = self._shown()
         width = max((len(name) for name, _ in rows), default=0)
         return "\n".join([type(self).__name__, *(f"  {name:<{width}}  {text}" for name, text in rows)])
 
-    def _repr_html_(self):
+    def _repr_html_(self) -> str:
         rows = "".join(f"<tr><th style='text-align:left'>{html.escape(name)}</th>"
                        f"<td style='text-align:left'>{html.escape(text)}</td></tr>"
                        for name, text in self._shown())
         return f"<table><caption>{type(self).__name__}</caption>{rows}</table>"
 
-    def __iter__(self):
+    def __iter__(self) -> Iterator[Any]:
         return iter([getattr(self, name) for name in self._unpacked or
                      [field.name for field in dataclasses.fields(self)]])
 
-    def __len__(self):
+    def __len__(self) -> int:
         return len(self._unpacked or dataclasses.fields(self))
 
 
-def _text(value):
+def _text(value: Any) -> str:
     if isinstance(value, np.ndarray):
         shown = np.array2string(value, precision=6, threshold=6, edgeitems=2, separator=" ")
         shape = " x ".join(map(str, value.shape))
@@ -48,6 +53,10 @@ def _text(value):
     return str(value)
 
 
-def result(of_class):
-    """A dataclass, derived from Result, that is shown as that says."""
-    return dataclasses.dataclass(eq=False, repr=False)(of_class)
+if TYPE_CHECKING:
+    from dataclasses import dataclass
+    result = dataclass
+else:
+    def result(of_class):
+        """A dataclass, derived from Result, that is shown as that says."""
+        return dataclasses.dataclass(eq=False, repr=False)(of_class)

@@ -5,11 +5,18 @@ together give the bits of one piece. `reset()` begins anew, `copy()` is a stream
 by itself, `finish()` returns what is still to come when the signal has ended. Streams can be pickled.
 """
 
+from __future__ import annotations
+
 import copy
+from typing import TYPE_CHECKING, Any, ClassVar
 
 import numpy as np
+from numpy.typing import ArrayLike, DTypeLike, NDArray
 
 from .axes import as_array, many
+
+if TYPE_CHECKING:
+    from typing_extensions import Self
 
 
 class Stream:
@@ -28,10 +35,10 @@ class Stream:
         `numpy.complex64`.
     """
 
-    dtypes = (np.dtype(float), np.dtype(complex))
-    _output = None  # the type of the results where it is another one
+    dtypes: ClassVar[tuple[np.dtype[Any], ...]] = (np.dtype(float), np.dtype(complex))
+    _output: Any = None  # the type of the results where it is another one
 
-    def __init__(self, channels=None, axis=-1, dtype=float):
+    def __init__(self, channels: int | None = None, axis: int = -1, dtype: DTypeLike = float) -> None:
         self.channels, self.axis, self.dtype = channels, axis, np.dtype(dtype)
         if self.dtype not in self.dtypes:
             known = ", ".join(str(one) for one in self.dtypes)
@@ -43,23 +50,26 @@ class Stream:
         self._last = axis in (-1, 1)  # the samples are along the last axis
         self.reset()
 
-    def _start(self):
+    def _start(self) -> Any:
         return None
 
-    def _end(self, state):
+    def _step(self, state: Any, block: NDArray[Any]) -> Any:
+        raise NotImplementedError
+
+    def _end(self, state: Any) -> Any:
         return np.empty(0, self._output or self.dtype)
 
-    def reset(self):
+    def reset(self) -> None:
         """Forgets all blocks so far."""
         self._states = [self._start() for _ in range(self.channels or 1)]
 
-    def copy(self):
+    def copy(self) -> Self:
         """A stream that has seen the same blocks and goes on by itself."""
         other = copy.copy(self)
         other._states = list(self._states)  # no state is changed in place
         return other
 
-    def __call__(self, block):
+    def __call__(self, block: ArrayLike) -> Any:
         if self.channels is None:
             if type(block) is not np.ndarray or block.dtype is not self.dtype or block.ndim != 1:
                 block = self._checked(block, 1)
@@ -69,13 +79,13 @@ class Stream:
             return found
         return self._through(self._checked(block, 2))
 
-    def finish(self):
+    def finish(self) -> Any:
         """What is still to come when the signal has ended; begins anew."""
         found = [self._end(state) for state in self._states]
         self.reset()
         return found[0] if self.channels is None else self._joined(found)
 
-    def _checked(self, block, dimensions):
+    def _checked(self, block: ArrayLike, dimensions: int) -> NDArray[Any]:
         array = as_array(block)
         if array.ndim != dimensions:
             raise ValueError(f"{type(self).__name__}: blocks of {dimensions} dimension"
@@ -88,7 +98,7 @@ class Stream:
                              f"{array.shape[int(not self._last)]} came")
         return array.astype(self.dtype, copy=False)
 
-    def _through(self, block):
+    def _through(self, block: NDArray[Any]) -> Any:
         rows = block if self._last else block.T
         if not rows.shape[1]:
             return self._joined([np.empty(0, self._output or self.dtype)] * len(rows))
@@ -96,5 +106,5 @@ class Stream:
         self._states = [state for _, state in found]
         return self._joined([output for output, _ in found])
 
-    def _joined(self, outputs):
+    def _joined(self, outputs: list[Any]) -> Any:
         return np.stack(outputs, 0 if self._last else 1)

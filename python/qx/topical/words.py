@@ -1,19 +1,23 @@
 """Words for choices, and refusals in the words of the caller."""
 
+from __future__ import annotations
+
 import difflib
 import operator
+from collections.abc import Mapping
+from typing import Any, NoReturn
 
 from ..library import library
 from ..outcomes import kind_of
 
 
-def refuse(function, argument, rule, name="ErrInvalidSelector"):
+def refuse(function: str, argument: str, rule: str, name: str = "ErrInvalidSelector") -> NoReturn:
     """Raises the exception for the code of that name, which names function, argument and rule."""
     raise kind_of(name)(f"qx.{function}", library().catalogue["codes"][name], None, "",
                         f"qx.{function}: {argument}: {rule} ({name})")
 
 
-def chosen(function, argument, value, words):
+def chosen(function: str, argument: str, value: Any, words: Mapping[Any, Any]) -> Any:
     """What the dictionary has for a word; others are refused with a list of the words."""
     try:
         return words[value]
@@ -26,7 +30,8 @@ def chosen(function, argument, value, words):
         f"; did you mean {word!r}?" for word in near))
 
 
-def whole_number(function, argument, value, least=None, name="ErrCountNotPositive"):
+def whole_number(function: str, argument: str, value: Any, least: int | None = None,
+                 name: str = "ErrCountNotPositive") -> int:
     """An int of at least `least`."""
     try:
         number = operator.index(value)
