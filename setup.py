@@ -38,8 +38,7 @@ class WithLibraries(build_py):
         for name in ("libqxanalysis.so", "libqxrt.so", "catalogue.json"):
             shutil.copy(libraries() / name, package)
         shutil.copytree(libraries() / "licences", package / "licences", dirs_exist_ok=True)
-        subprocess.run([sys.executable, "-m", "qx.stubs", package / "__init__.pyi",
-                        package / "exports.pyi"], check=True,
+        subprocess.run([sys.executable, "-m", "qx.stubs", package], check=True,
                        env={**os.environ, "PYTHONPATH": os.pathsep.join(
                            [self.build_lib, *filter(None, sys.path)]), "QX_LIBRARY_DIR": ""})
 

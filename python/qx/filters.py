@@ -12,7 +12,6 @@ Frequencies are in the unit of the sampling rate `fs`; with its default 1.0 in c
 from __future__ import annotations
 
 import math
-from collections.abc import Sequence
 from typing import Any, Literal
 
 import numpy as np
@@ -875,8 +874,8 @@ def narrow(edges: ArrayLike, kind: Literal["lowpass", "highpass", "bandpass", "b
                          float(attenuation), code, {})
     taps = core.narrow_filter([1.0], design)
     main = (0.0, 0.5, centre / fs, 0.0)[code]
-    return Filter(taps, EMPTY, False, fs, f"narrow {kind}, edges {', '.join(f'{edge:g}' for edge in edges)}, fs {fs:g}",
-                  main)
+    return Filter(taps, EMPTY, False, fs, f"narrow {kind}, edges {', '.join(f'{edge:g}' for edge in corners)}, "
+                  f"fs {fs:g}", main)
 
 
 def from_sos(sos: ArrayLike, fs: float = 1.0) -> Filter:

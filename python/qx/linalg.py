@@ -28,7 +28,7 @@ __all__ = ["Eigen", "GSVD", "Hessenberg", "LU", "LeastSquares", "QR", "QZ", "SVD
 
 core = served("linalg")
 
-EPS = np.finfo(float).eps
+EPS = float(np.finfo(float).eps)
 WORST = 1e-4 / EPS  # the condition from which on fewer than four digits are certain
 SMALL = 48  # the order up to which an inverse costs less than an estimate of its norm
 
@@ -226,7 +226,7 @@ def _each(function: Any, *stacks: Any) -> Any:
     return stacked(found)
 
 
-def _near_one(a: Any) -> Any:
+def _near_one(a: NDArray[Any]) -> tuple[NDArray[Any], Any]:
     """The matrix by the power of two next to its largest element, and that power. What is made of singular
     values loses digits for matrices of a norm far below 1."""
     largest = np.abs(a).max(initial=0)
@@ -395,7 +395,7 @@ def lstsq(a: ArrayLike, b: ArrayLike, rcond: float | None = None) -> LeastSquare
         refuse("linalg.lstsq", "a", "one matrix is needed, not a stack", "ErrSizesDisagree")
     columns, is_vector = _sides("linalg.lstsq", a, b)
     scaled, power = _near_one(a)
-    limit = max(a.shape) * EPS if rcond is None else float(rcond)
+    limit: float = max(a.shape) * EPS if rcond is None else float(rcond)
     x = _served("lstsq", a, columns)(scaled, columns, limit / max(a.shape)) / power
     values = _served("svdvals", a)(scaled) * power
     rank = int(np.sum(values > limit * values.max(initial=0)))

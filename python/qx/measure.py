@@ -15,7 +15,7 @@ from numpy.typing import ArrayLike, NDArray
 
 from . import measuring, windows
 from .outcomes import QxError
-from .topical import (LAST, Result, Stream, along, chosen, refuse, result, served, vector,
+from .topical import (LAST, Result, Stream, along, along_pairs, by_channel, chosen, count_of, refuse, result, served,
                       whole_number)
 
 if TYPE_CHECKING:
@@ -247,13 +247,13 @@ def _rate(function: Any, fs: Any) -> Any:
 
 
 def peaks(x: ArrayLike, fs: float = 1.0, height: float | None = None, prominence: float | None = None,
-          distance: float | None = None, valleys: bool = False) -> Peaks:
+          distance: float | None = None, valleys: bool = False, axis: int = LAST) -> Any:
     """The peaks of a signal, or its valleys.
 
     Parameters
     ----------
     x : array_like
-        Real samples, of one dimension.
+        Real samples, of any dimension.
     fs : float
         The sampling rate.
     height : float, optional
@@ -265,15 +265,17 @@ def peaks(x: ArrayLike, fs: float = 1.0, height: float | None = None, prominence
         Of peaks nearer than this, in time, the less prominent ones go.
     valleys : bool
         Look for valleys.
+    axis : int
+        The axis of time.
 
     Returns
     -------
-    Peaks
+    Peaks, or a list of what each channel has
 
     Raises
     ------
     ValueError
-        If x has another number of dimensions than one, or fs is not above 0.
+        If x has no channel, or fs is not above 0.
 
     Examples
     --------
@@ -282,7 +284,13 @@ def peaks(x: ArrayLike, fs: float = 1.0, height: float | None = None, prominence
     >>> qx.measure.peaks(x, 1000).positions.round(4)
     array([0.1887, 0.3774, 0.566 , 0.7547, 0.9434])
     """
-    x, fs = vector(x, "measure.peaks", "x").astype(float), _rate("peaks", fs)
+    fs = _rate("peaks", fs)
+    return by_channel(lambda channel: _peaks(channel.astype(float), fs, height, prominence, distance, valleys),
+                      x, axis)
+
+
+def _peaks(x: NDArray[Any], fs: float, height: float | None, prominence: float | None, distance: float | None,
+           valleys: bool) -> Peaks:
     sign = -1.0 if valleys else 1.0
     values = sign * x
     at = measuring.local_maxima(values) if len(x) > 2 else np.zeros(0, int)
@@ -403,21 +411,24 @@ def _no_triggers() -> Any:
     return Triggers(np.empty(0), np.empty(0, int))
 
 
-def levels(x: ArrayLike, method: Literal["auto", "histogram", "peak"] = "auto", bins: int = 256) -> Levels:
+def levels(x: ArrayLike, method: Literal["auto", "histogram", "peak"] = "auto", bins: int = 256,
+           axis: int = LAST) -> Any:
     """The levels of the two states of a waveform.
 
     Parameters
     ----------
     x : array_like
-        Real samples, of one dimension.
+        Real samples, of any dimension.
     method : {"auto", "histogram", "peak"}
         The modes of the histogram, the extremes, or whichever fits.
     bins : int
         Of the histogram.
+    axis : int
+        The axis of time.
 
     Returns
     -------
-    Levels
+    Levels, or a list of what each channel has
 
     Raises
     ------
@@ -434,29 +445,31 @@ def levels(x: ArrayLike, method: Literal["auto", "histogram", "peak"] = "auto", 
     """
     code = chosen("measure.levels", "method", method, LEVELS)
     bins = whole_number("measure.levels", "bins", bins, 1, "ErrMeasureEmptyChannel")
-    return Levels(*core.levels(vector(x, "measure.levels", "x"), 0.0, 1.0, code, bins, 0))
+    return by_channel(lambda channel: Levels(*core.levels(channel, 0.0, 1.0, code, bins, 0)), x, axis)
 
 
-def pulses(x: ArrayLike, fs: float = 1.0, first: Literal["rising", "falling"] = "rising") -> list[Pulse]:
+def pulses(x: ArrayLike, fs: float = 1.0, first: Literal["rising", "falling"] = "rising", axis: int = LAST) -> Any:
     """The pulses of a waveform, up to 1000.
 
     Parameters
     ----------
     x : array_like
-        Real samples, of one dimension.
+        Real samples, of any dimension.
     fs : float
         The sampling rate.
     first : {"rising", "falling"}
         The edge that a pulse begins with.
+    axis : int
+        The axis of time.
 
     Returns
     -------
-    list of Pulse
+    list of Pulse, or a list of what each channel has
 
     Raises
     ------
     ValueError
-        If x has another number of dimensions than one, or first is none of its words.
+        If x has no channel, or first is none of its words.
 
     Examples
     --------
@@ -466,10 +479,15 @@ def pulses(x: ArrayLike, fs: float = 1.0, first: Literal["rising", "falling"] = 
     >>> round(found.width, 3), round(found.rise, 3)
     (4.0, 0.792)
     """
-    x, fs = vector(x, "measure.pulses", "x").astype(float), _rate("pulses", fs)
+    fs = _rate("pulses", fs)
     direction = chosen("measure.pulses", "first", first, POLARITIES)
+    return by_channel(lambda channel: _pulses(channel.astype(float), fs, direction), x, axis)
+
+
+def _pulses(x: NDArray[Any], fs: float, direction: int) -> list[Pulse]:
     return [Pulse((one.middle - one.width / 2) / fs, one.middle / fs, one.width / fs, one.high, one.low,
-                  *((one.first_duration / fs, one.second_duration / fs)[::1 if one.rises else -1]),
+                  (one.first_duration if one.rises else one.second_duration) / fs,
+                  (one.second_duration if one.rises else one.first_duration) / fs,
                   one.slew_rate * fs, one.first_overshoot, one.second_overshoot)
             for one in measuring.pulses(x, direction)]
 
@@ -497,20 +515,22 @@ class Cycles(Result):
         return len(self.starts)
 
 
-def cycles(x: ArrayLike, fs: float = 1.0) -> Cycles:
+def cycles(x: ArrayLike, fs: float = 1.0, axis: int = LAST) -> Any:
     """Mean and root mean square over each cycle of a waveform, between crossings of the middle of its
     two levels; up to 1000 cycles.
 
     Parameters
     ----------
     x : array_like
-        Real values.
+        Real values, of any dimension.
     fs : float
         The sampling rate.
+    axis : int
+        The axis of time.
 
     Returns
     -------
-    Cycles
+    Cycles, or a list of what each channel has
 
     Raises
     ------
@@ -526,7 +546,11 @@ def cycles(x: ArrayLike, fs: float = 1.0) -> Cycles:
     >>> found.means.round(2), found.rms.round(2)
     (array([3., 3., 3., 3., 3., 3., 3., 3., 3.]), array([3.08, 3.08, 3.08, 3.08, 3.08, 3.08, 3.08, 3.08, 3.08]))
     """
-    x, fs = vector(x, "measure.cycles", "x").astype(float), _rate("cycles", fs)
+    fs = _rate("cycles", fs)
+    return by_channel(lambda channel: _cycles(channel.astype(float), fs), x, axis)
+
+
+def _cycles(x: NDArray[Any], fs: float) -> Cycles:
     found = []
     while len(found) < measuring.MOST_PULSES:
         try:
@@ -540,23 +564,25 @@ def cycles(x: ArrayLike, fs: float = 1.0) -> Cycles:
     return Cycles(*np.array(found).reshape(-1, 4).T)
 
 
-def tone(x: ArrayLike, fs: float = 1.0, near: float | None = None, within: float | None = None) -> Tone:
+def tone(x: ArrayLike, fs: float = 1.0, near: float | None = None, within: float | None = None, axis: int = LAST) -> Any:
     """The largest tone, or the largest near a frequency, fitted by least squares (IEEE Std 1057).
 
     Parameters
     ----------
     x : array_like
-        Real samples, of one dimension.
+        Real samples, of any dimension.
     fs : float
         The sampling rate.
     near : float, optional
         About where it is, in the unit of fs.
     within : float, optional
         How far from there it may be; 2 bins by default.
+    axis : int
+        The axis of time.
 
     Returns
     -------
-    Tone
+    Tone, or a list of what each channel has
 
     Raises
     ------
@@ -572,29 +598,32 @@ def tone(x: ArrayLike, fs: float = 1.0, near: float | None = None, within: float
     >>> round(found.frequency, 6), round(found.amplitude, 6)
     (50.2, 1.0)
     """
-    x, fs = vector(x, "measure.tone", "x"), _rate("tone", fs)
-    half = 0.0 if near is None else 2 * fs / max(len(x), 1) if within is None else float(within)
-    return Tone(*core.tone(x, 1 / fs, 0.0 if near is None else float(near), half))
+    fs = _rate("tone", fs)
+    half = 0.0 if near is None else 2 * fs / max(count_of(x, axis), 1) if within is None else float(within)
+    return by_channel(lambda channel: Tone(*core.tone(channel, 1 / fs, 0.0 if near is None else float(near), half)),
+                      x, axis)
 
 
 def tones(x: ArrayLike, fs: float = 1.0, count: int = 5,
-          order: Literal["amplitude", "frequency"] = "amplitude") -> Tones:
+          order: Literal["amplitude", "frequency"] = "amplitude", axis: int = LAST) -> Any:
     """The largest tones, fitted together by least squares; fewer where the rest could be noise.
 
     Parameters
     ----------
     x : array_like
-        Real samples, of one dimension.
+        Real samples, of any dimension.
     fs : float
         The sampling rate.
     count : int
         How many at most.
     order : {"amplitude", "frequency"}
         Falling amplitudes or rising frequencies.
+    axis : int
+        The axis of time.
 
     Returns
     -------
-    Tones
+    Tones, or a list of what each channel has
 
     Raises
     ------
@@ -612,17 +641,18 @@ def tones(x: ArrayLike, fs: float = 1.0, count: int = 5,
     """
     code = chosen("measure.tones", "order", order, {"amplitude": 0, "frequency": 1})
     count = whole_number("measure.tones", "count", count, 1, "ErrMeasureBadCount")
-    return Tones(*core.tones(vector(x, "measure.tones", "x"), 1 / _rate("tones", fs), count, code))
+    step = 1 / _rate("tones", fs)
+    return by_channel(lambda channel: Tones(*core.tones(channel, step, count, code)), x, axis)
 
 
 def harmonics(x: ArrayLike, fs: float = 1.0, fundamental: float | None = None, count: int = 10,
-              full_scale: float | None = None) -> Harmonics:
+              full_scale: float | None = None, axis: int = LAST) -> Any:
     """A tone, its harmonics, and the distortion and noise beside it.
 
     Parameters
     ----------
     x : array_like
-        Real samples, of one dimension.
+        Real samples, of any dimension.
     fs : float
         The sampling rate.
     fundamental : float, optional
@@ -631,10 +661,12 @@ def harmonics(x: ArrayLike, fs: float = 1.0, fundamental: float | None = None, c
         Harmonics up to this multiple, or as many as the samples can tell.
     full_scale : float, optional
         The amplitude to which effective bits refer; that of the tone by default.
+    axis : int
+        The axis of time.
 
     Returns
     -------
-    Harmonics
+    Harmonics, or a list of what each channel has
 
     Raises
     ------
@@ -650,21 +682,22 @@ def harmonics(x: ArrayLike, fs: float = 1.0, fundamental: float | None = None, c
     >>> round(qx.measure.harmonics(x, 1000).thd, 9)
     0.01
     """
-    x = vector(x, "measure.harmonics", "x")
-    count = min(whole_number("measure.harmonics", "count", count, 1, "ErrMeasureBadCount"), max(1, len(x) // 2 - 1))
-    return Harmonics(*core.harmonics(x, 1 / _rate("harmonics", fs), float(fundamental or 0), count,
-                                     float(full_scale or 0)))
+    most = min(whole_number("measure.harmonics", "count", count, 1, "ErrMeasureBadCount"),
+               max(1, count_of(x, axis) // 2 - 1))
+    step = 1 / _rate("harmonics", fs)
+    return by_channel(lambda channel: Harmonics(*core.harmonics(channel, step, float(fundamental or 0), most,
+                                                                float(full_scale or 0))), x, axis)
 
 
 def trigger(x: ArrayLike, level: float, fs: float = 1.0,
             slope: Literal["rising", "falling", "either"] = "rising", hysteresis: float = 0.0,
-            holdoff: float = 0.0) -> Triggers:
+            holdoff: float = 0.0, axis: int = LAST) -> Any:
     """All places where a signal passes a level.
 
     Parameters
     ----------
     x : array_like
-        Real samples, of one dimension.
+        Real samples, of any dimension.
     level : float
         The level.
     fs : float
@@ -675,10 +708,12 @@ def trigger(x: ArrayLike, level: float, fs: float = 1.0,
         How far beyond the level the signal must have been before.
     holdoff : float
         The time after a trigger in which none follows.
+    axis : int
+        The axis of time.
 
     Returns
     -------
-    Triggers
+    Triggers, or a list of what each channel has
 
     Raises
     ------
@@ -691,7 +726,8 @@ def trigger(x: ArrayLike, level: float, fs: float = 1.0,
     >>> qx.measure.trigger(qx.signals.sine(100, 0.04), 0.5).positions.round(2)
     array([ 2.09, 27.09, 52.09, 77.09])
     """
-    return Trigger(level, fs, slope, hysteresis, holdoff)(vector(x, "measure.trigger", "x").astype(float))
+    return by_channel(lambda channel: Trigger(level, fs, slope, hysteresis, holdoff)(channel.astype(float)),
+                      x, axis)
 
 
 class Trigger(Stream):
@@ -757,22 +793,25 @@ class Trigger(Stream):
         return _no_triggers()
 
 
-def delay(x: ArrayLike, y: ArrayLike, fs: float = 1.0, most: float | None = None) -> float:
+def delay(x: ArrayLike, y: ArrayLike, fs: float = 1.0, most: float | None = None,
+          axis: int = LAST) -> Any:
     """By how much y is later than x: the place of the peak of their cross-correlation, between samples
     by the correlation's own Fourier series, which is exact where the spectra end below fs / 2.
 
     Parameters
     ----------
     x, y : array_like
-        Two real signals.
+        Real signals; one channel against several, or channels in pairs.
     fs : float
         The sampling rate.
     most : float, optional
         The largest delay in either direction, in time.
+    axis : int
+        The axis of time.
 
     Returns
     -------
-    float
+    float or ndarray
         In time; negative where y is earlier.
 
     Raises
@@ -790,7 +829,10 @@ def delay(x: ArrayLike, y: ArrayLike, fs: float = 1.0, most: float | None = None
     7.0
     """
     fs = _rate("delay", fs)
-    x, y = (vector(one, "measure.delay", name).astype(float) for one, name in ((x, "x"), (y, "y")))
+    return along_pairs(lambda one, other: _delay(one.astype(float), other.astype(float), fs, most), x, y, axis)
+
+
+def _delay(x: NDArray[Any], y: NDArray[Any], fs: float, most: float | None) -> float:
     if not len(x) or not len(y):
         refuse("measure.delay", "x, y", "an array is empty", "ErrEmptyInput")
     x, y = x - x.mean(), y - y.mean()
@@ -1010,7 +1052,9 @@ def octave_bands(x: ArrayLike, fs: float, fraction: int = 3, low: float | None =
     fs = _rate("octave_bands", fs)
     fraction = whole_number(name, "fraction", fraction, 1)
     half = _BAND_RATIO ** (0.5 / fraction)
-    middles = band_frequencies(fraction, low, 0.45 * fs / half if high is None else high)
+    if high is None:
+        high = float(0.45 * fs / half)
+    middles = band_frequencies(fraction, low, high)
     if not len(middles):
         refuse(name, "low, high", "there is no band between them", "ErrRangeReversed")
     if middles[-1] * half >= fs / 2:

@@ -1,26 +1,34 @@
-"""Writes the stub files, for type checkers and editors: python3 -m qx.stubs FILE [EXPORTS], of the package
-and of qx.exports."""
+"""Writes the stub files, for type checkers and editors, into a folder:
+
+    python3 -m qx.stubs [FOLDER | --check]
+
+`__init__.pyi`, of the package, and `exports.pyi`, with every export. Without a folder they go beside the
+modules, with a sentence on each export instead of its text, which changes more often than the arguments.
+With --check nothing is written, and the status is 0 if those are up to date.
+"""
 
 import re
 import sys
 from pathlib import Path
 
+from .catalogue import summary
 from .functions import documentation, parameters, returned
 from .library import library
 from .topical.newest import TOPICS
 
-HEAD = '''"""The exports as functions. Written by qx.stubs from the catalogue."""
+HERE = Path(__file__).parent
+
+PACKAGE = '''"""The names of the package. Written by qx.stubs."""
 
 from builtins import list as _list
-from collections.abc import Callable, Mapping
+from collections.abc import Callable
 from typing import Any
 
-import numpy as np
-from numpy.typing import ArrayLike, NDArray
-
-from . import exports as exports, {topics}
+from . import exports as exports
+{topics}
 from .calls import NoSuchExport as NoSuchExport, call as call
 from .catalogue import Found
+from .exports import *
 from .library import NotBuilt as NotBuilt
 from .outcomes import ArgumentError as ArgumentError, MatrixError as MatrixError, \\
     OutOfMemory as OutOfMemory, QxError as QxError, QxWarning as QxWarning
@@ -34,7 +42,7 @@ def list(pattern: str = "*") -> Found: ...
 def names() -> _list[str]: ...
 '''
 
-EXPORTS_HEAD = '''"""Every export as a function. Written by qx.stubs from the catalogue."""
+EXPORTS = '''"""Every export as a function. Written by qx.stubs from the catalogue."""
 
 from collections.abc import Mapping
 from typing import Any
@@ -46,23 +54,29 @@ from .pointers import Pointer
 '''
 
 
-def stub(entry):
+def stub(entry, is_full):
     """The function in a stub file."""
-    text = re.sub(r": '([^']*)'", r": \1", parameters(entry))
-    lines = documentation(entry).replace("\\", "\\\\").replace('"""', "'''").split("\n")
+    signature = re.sub(r": '([^']*)'", r": \1", parameters(entry))
+    text = documentation(entry) if is_full else summary(entry, 100)
+    lines = text.replace("\\", "\\\\").replace('"""', "'''").split("\n")
     body = "\n".join([lines[0], *(f"    {line}" if line else "" for line in lines[1:])])
-    return f'def {entry["name"]}({text}) -> {returned(entry)}:\n    """{body}"""\n'
+    return f'def {entry["name"]}({signature}) -> {returned(entry)}:\n    """{body}"""\n'
 
 
-def text():
-    topics = ", ".join(f"{topic} as {topic}" for topic in TOPICS)
-    return "\n\n".join([HEAD.replace("{topics}", topics), *map(stub, library().catalogue["exports"])])
+def texts(is_full=True):
+    """The files by their names."""
+    topics = "\n".join(f"from . import {topic} as {topic}" for topic in TOPICS)
+    exports = [EXPORTS, *(stub(entry, is_full) for entry in library().catalogue["exports"])]
+    return {"__init__.pyi": PACKAGE.replace("{topics}", topics), "exports.pyi": "\n\n".join(exports)}
 
 
-def text_of_exports():
-    return "\n\n".join([EXPORTS_HEAD, *map(stub, library().catalogue["exports"])])
+def main(*arguments):
+    if arguments == ("--check",):
+        return int(any((HERE / name).read_text("utf-8") != text for name, text in texts(False).items()))
+    for name, text in texts(bool(arguments)).items():
+        Path(*(arguments or [HERE]), name).write_text(text, "utf-8")
+    return 0
 
 
 if __name__ == "__main__":
-    for path, written in zip(sys.argv[1:], (text, text_of_exports)):
-        Path(path).write_text(written(), "utf-8")
+    sys.exit(main(*sys.argv[1:]))

@@ -441,7 +441,7 @@ class Selectors(unittest.TestCase):
 
 class Functions(unittest.TestCase):
     def test_every_export_is_a_function(self):
-        stub = {node.name: node for node in ast.parse(stubs.text()).body
+        stub = {node.name: node for node in ast.parse(stubs.texts()["exports.pyi"]).body
                 if isinstance(node, ast.FunctionDef)}
         for name, entry in library().entries.items():
             function = getattr(qx, name)

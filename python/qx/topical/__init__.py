@@ -7,7 +7,8 @@ How to write one:
   newer revision of an export appears, its name goes into the table, and nothing else changes.
 - A function of one channel is taken to arrays of any dimension by `along(function, x, axis)`: the axis,
   threads for many channels, pandas in and out. Its fast way, one channel as a NumPy array, costs about
-  0.2 us. `either(real, complex, x, axis)` chooses by the type of x. The axis has the default `LAST`.
+  0.2 us. `either(real, complex, x, axis)` chooses by the type of x. The axis has the default `LAST`. Where
+  what is found in a channel is no array, `by_channel(function, x, axis)` lists it by channels.
 - A choice is a word: `chosen("filters.butterworth", "kind", kind, KINDS)` looks it up in a dictionary
   and refuses others with a list of the words.
 - What the export would refuse in words that are not the caller's is refused before by
@@ -21,11 +22,11 @@ How to write one:
   runs the examples of every topic, and holds each key of the table to a function.
 """
 
-from .axes import LAST, along, count_of, either, vector
+from .axes import LAST, along, along_pairs, by_channel, count_of, either, vector
 from .newest import TOPICS, served
 from .results import Result as Result, result as result
 from .streams import Stream
 from .words import chosen, refuse, whole_number
 
-__all__ = ["LAST", "Result", "Stream", "TOPICS", "along", "chosen", "count_of", "either", "refuse", "result",
-           "served", "vector", "whole_number"]
+__all__ = ["LAST", "Result", "Stream", "TOPICS", "along", "along_pairs", "by_channel", "chosen", "count_of",
+           "either", "refuse", "result", "served", "vector", "whole_number"]

@@ -113,22 +113,57 @@ def along(function: Channel, x: ArrayLike, axis: int = LAST) -> Any:
     return _along(function, as_array(x), axis)
 
 
-def _along(function: Channel, x: NDArray[Any], axis: int) -> Any:
+def _check_axis(x: NDArray[Any], axis: int) -> None:
     if x.ndim == 0:
         raise ValueError("an array of at least one dimension is needed; a single number came")
     if not -x.ndim <= axis < x.ndim:
         raise ValueError(f"axis {int(axis)} is none of an array of {x.ndim} dimension{'s'[:x.ndim - 1]}")
+    if x.ndim > 1 and not x.size and 0 in np.delete(x.shape, axis):
+        raise ValueError(f"an array of shape {x.shape} has no channel along axis {int(axis)}")
+
+
+def _along(function: Channel, x: NDArray[Any], axis: int) -> Any:
+    _check_axis(x, axis)
     if x.ndim == 1:
         return function(x)
     moved = np.moveaxis(x, axis, -1)
     flat = moved.reshape(-1, moved.shape[-1])
-    if not len(flat):
-        raise ValueError(f"an array of shape {x.shape} has no channel along axis {int(axis)}")
     found = many(function, flat, x.size)
     place = axis % x.ndim
     if isinstance(found[0], tuple):
         return tuple(_together(parts, moved.shape[:-1], place) for parts in zip(*found))
     return _together(found, moved.shape[:-1], place)
+
+
+def by_channel(function: Channel, x: ArrayLike, axis: int = LAST) -> Any:
+    """What the function returns for one channel; for several, a list with that of each, and lists of lists
+    where x has more dimensions than two. Of a pandas table the columns are channels."""
+    if is_pandas(x):
+        axis = 0 if axis is LAST else axis
+    x = as_array(x)
+    if x.ndim == 1 and axis in (-1, 0):
+        return function(x)
+    _check_axis(x, axis)
+    moved = np.moveaxis(x, axis, -1)
+    found = many(function, moved.reshape(-1, moved.shape[-1]), x.size)
+    for count in moved.shape[-2:0:-1]:
+        found = [found[first:first + count] for first in range(0, len(found), count)]
+    return found
+
+
+def along_pairs(function: Callable[[NDArray[Any], NDArray[Any]], float], x: ArrayLike, y: ArrayLike,
+                axis: int = LAST) -> Any:
+    """The number that the function returns for each pair of channels of x and y, whose channels are
+    broadcast against each other; they may differ in length."""
+    places = [0 if axis is LAST and is_pandas(one) else axis for one in (x, y)]
+    arrays = [as_array(one) for one in (x, y)]
+    for one, place in zip(arrays, places):
+        _check_axis(one, 0 if one.ndim == 1 else place)  # a single channel has one axis
+    moved = [one if one.ndim == 1 else np.moveaxis(one, place, -1) for one, place in zip(arrays, places)]
+    shape = np.broadcast_shapes(*(one.shape[:-1] for one in moved))
+    rows = [np.broadcast_to(one, (*shape, one.shape[-1])).reshape(-1, one.shape[-1]) for one in moved]
+    found = many(lambda pair: function(*pair), [*zip(*rows)], sum(row.size for row in rows))
+    return np.array(found).reshape(shape) if shape else found[0]
 
 
 def _together(parts: Sequence[Any], shape: tuple[int, ...], place: int) -> NDArray[Any]:

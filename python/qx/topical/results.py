@@ -10,6 +10,8 @@ from typing import TYPE_CHECKING, Any, ClassVar
 import numpy as np
 
 
+__all__ = ["Result", "result"]
+
 
 class Result:
     """Base of results: shown line by line, unpacked as a tuple of the fields that `_unpacked` names,
@@ -54,8 +56,7 @@ def _text(value: Any) -> str:
 
 
 if TYPE_CHECKING:
-    from dataclasses import dataclass
-    result = dataclass
+    from dataclasses import dataclass as result
 else:
     def result(of_class):
         """A dataclass, derived from Result, that is shown as that says."""
