@@ -1009,7 +1009,7 @@ def sound_level(x: ArrayLike, fs: float, weighting: Literal["A", "C", "Z"] = "A"
     return along(of_channel, x, axis)
 
 
-def octave_bands(x: ArrayLike, fs: float, fraction: int = 3, low: float | None = 25.0,
+def octave_bands(x: ArrayLike, fs: float, fraction: int = 3, low: float = 25.0,
                  high: float | None = None, reference: float = 1.0, axis: int = LAST) -> Bands:
     """The levels in bands of an octave or a fraction of one, by Butterworth bandpass filters with the
     midband frequencies and edges of IEC 61260-1. Low bands are filtered at a lower rate.

@@ -32,7 +32,7 @@ except qx.QxError as error:
 
 # Each line with what is wrong in it.
 WRONG = {
-    'qx.filters.butterworth(4, 40, "lowpas")': 'incompatible type .*"lowpas"',
+    'qx.filters.butterworth(4, 40, "lowpas")': "Literal.'lowpas'",
     "qx.filters.butterworth()": "Missing positional argument",
     "qx.filters.butterwort(4, 40)": "has no attribute",
     "qx.fft.rfft([1.0]).frequencies": "has no attribute",
