@@ -16,7 +16,7 @@ from qx.library import library  # noqa: E402
 from qx.topical.newest import NEWEST, TOPICS, function_of  # noqa: E402
 
 PAGE = ROOT / "docs/topics.md"
-ELDER, TWIN, HOST, NONE = "elder, for comparison", "for hosts: plan in instance data", "for hosts", "none yet"
+ELDER, TWIN, HOST = "elder, for comparison", "for hosts: plan in instance data", "for hosts"
 # What the table of topical/newest.py does not name, by patterns in order: the functions that do the same by
 # another export, and a remark.
 OTHERS = (
@@ -26,10 +26,10 @@ OTHERS = (
     ("InvChebyshevCoefs", "filters.chebyshev2"), ("EllipticCoefs", "filters.elliptic"),
     ("BesselCoefs", "filters.bessel"), ("MedianFilterCIN", "filters.median"),
     ("zeroPhase*", "filters.Filter.zero_phase"), ("*IIR_Filter_PtbyPt *IIR_Filter_OneState", "filters.Filter.stream"),
-    ("CxSigFIRnarrowFilter_head", "filters.narrow"), ("CxIIR*Filter_H", NONE),
+    ("CxSigFIRnarrowFilter_head", "filters.narrow"),
     ("InvCxOXFFTH80", "fft.ifft"), ("InvReOXFFTH80", "fft.irfft"), ("ReInvFFT2D_H", "fft.ifft2"),
     ("DCT_2DH", "fft.dct over both axes"), ("InvDCT_2DH", "fft.idct over both axes"),
-    ("DST_2DH", "fft.dst over both axes"), ("InvDST_2DH", "fft.idst over both axes"), ("*DZTH", NONE),
+    ("DST_2DH", "fft.dst over both axes"), ("InvDST_2DH", "fft.idst over both axes"),
     ("*WinH *Wind* Kaiser* CxKaiser* *CosTapered* TriangleWin", "windows.get, windows.apply"),
     ("WinConstByNameH*", "windows.constants"), ("*CrossSpectrumH", "spectra.csd"),
     ("SinePtrn", "signals.sine"), ("Square", "signals.square"), ("RampPtrn*", "signals.ramp"),
@@ -38,9 +38,8 @@ OTHERS = (
     ("Riffle*Num_head", "noise.permutation"), ("RiffleArray*", "noise.shuffle"),
     ("Decimate* CxDecimate_H *DecimatedMovingAverageH", "multirate.decimate"),
     ("*RationalResample* InterpolatorFIRH DecimatorFIRH", "multirate.resample"),
-    ("*Resample_Const *Resample_Variable* InterpolatedFIRH", NONE),
+    ("*Resample_Variable_MultiCh", "multirate.resample_at of several channels"),
     ("*EqsSetBySVD*", "linalg.lstsq"),
-    ("*CheckPosSemiDef_head", NONE),
     ("*EqsBy* *EqsSetBy* *LinEqs TriLinEqs_head *CholeskyLinEqs_head CxTriLinEqs_head", "linalg.solve"),
     ("*GenLinEqs*", "linalg.lstsq"), ("*InvMatrix* PreallocInv*", "linalg.inv"),
     ("Cholesky_head CxCholesky_head", "linalg.cholesky"), ("*qrd_head", "linalg.qr"), ("*SVD_head", "linalg.svd"),
@@ -49,7 +48,6 @@ OTHERS = (
     ("*Lyapunov_head", "linalg.solve_lyapunov"), ("*nitVector*", "x / linalg.norm(x)"),
     ("MatrixMul_head AxBCxCIN AxVect_head AxVectorCx *vectxA_head CxVectxA_head DotP* Dotprod*", "NumPy: a @ b"),
     ("*ranspose_head *Compact* OuterProd*", "NumPy: a.T, numpy.tril, numpy.outer"),
-    ("*AutoCorrMtrxH CreateMatrixFromEVs_head", NONE),
     ("CxPolyRoots_head PolyRootsNtBst_head", "poly.roots"),
     ("LinFit*", "fit.line"), ("PolyFit*", "fit.polynomial"), ("GenLSFit_head", "fit.linear"), ("ExpFit*", "fit.exponential"),
     ("PowerFit*", "fit.power"), ("LogFit*", "fit.logarithm"), ("GaussianPeakFit*", "fit.gaussian"),
@@ -81,7 +79,7 @@ def served():
 def remark(name):
     for patterns, text in OTHERS:
         if any(fnmatch.fnmatchcase(name, pattern) for pattern in patterns.split()):
-            return text if text in (TWIN, HOST, NONE) else f"{text} ({ELDER})" if "." in text and "NumPy" not in text \
+            return text if text in (TWIN, HOST) else f"{text} ({ELDER})" if "." in text and "NumPy" not in text \
                 else text
     raise LookupError(f"nothing serves {name}: name it in topical/newest.py or in {Path(__file__).name}")
 

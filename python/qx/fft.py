@@ -10,6 +10,7 @@ behind the scenes for each length and thread.
 
 from __future__ import annotations
 
+import math
 from typing import Any, Literal
 
 import numpy as np
@@ -17,7 +18,7 @@ from numpy.typing import ArrayLike, NDArray
 
 from .topical import LAST, along, chosen, count_of, either, refuse, served, whole_number
 
-__all__ = ["czt", "dct", "dst", "fft", "fft2", "fftfreq", "fftshift", "half_complex", "hartley",
+__all__ = ["czt", "dct", "dst", "dzt", "fft", "fft2", "fftfreq", "fftshift", "half_complex", "hartley",
            "hilbert", "iczt", "idct", "idst", "ifft", "ifft2", "ifftshift", "ihalf_complex",
            "ihartley", "ihilbert", "irfft", "rfft", "rfftfreq", "zoom"]
 
@@ -806,6 +807,61 @@ def iczt(x: ArrayLike, w: complex | None = None, a: complex = 1.0, axis: int = L
     n = count_of(x, axis)
     w = np.exp(-2j * np.pi / max(n, 1)) if w is None else w
     return along(lambda channel: core.iczt(channel, a, w, n), x, axis)
+
+
+def dzt(x: ArrayLike, start: int, size: int, n: int | None = None, axis: int = LAST) -> NDArray[np.complex128]:
+    r"""Some neighbouring bins of a long transform, without the others (dilated Z transform).
+
+    .. math:: X_k = \sum_j x_j\, e^{-2\pi i j k / n}, \quad k = \text{start} \ldots \text{start} + \text{size} - 1
+
+    It is made of transforms whose length is a divisor of n, and so gains nothing where n is prime.
+
+    Parameters
+    ----------
+    x : array_like
+        Real or complex values.
+    start : int
+        The first bin, cyclic: -1 is the last one.
+    size : int
+        How many bins.
+    n : int, optional
+        The length of the transform; the values are cut or filled with zeros. As many as there are by default.
+    axis : int
+        The axis along which to transform.
+
+    Returns
+    -------
+    ndarray of complex128
+
+    Raises
+    ------
+    ValueError
+        If x is empty, or n or size is below 1.
+
+    Examples
+    --------
+    >>> import numpy as np, qx
+    >>> x = qx.signals.sine(4096, 0.1)
+    >>> bool(np.allclose(qx.fft.dzt(x, 400, 20), qx.fft.fft(x)[400:420]))
+    True
+    """
+    length = _length("fft.dzt", n, x, axis)
+    count = whole_number("fft.dzt", "size", size, 1, "ErrFFTSizeNotPositive")
+    first = whole_number("fft.dzt", "start", start) % length
+    pieces = _pieces(length, count)
+
+    def of(export: Any) -> Any:
+        # The export folds what is longer and works in place.
+        return lambda channel: export(channel[:length], pieces, length // pieces, first, count)[1]
+
+    return either(of(core.dzt), of(core.dzt_complex), x, axis)
+
+
+def _pieces(length: int, count: int) -> int:
+    """Into how many transforms it is least work to cut one of which `count` bins are wanted."""
+    divisors = [one for small in range(1, math.isqrt(length) + 1) if length % small == 0
+                for one in (small, length // small)]
+    return min(divisors, key=lambda pieces: length * math.log2(2 * length / pieces) + 4 * count * pieces)
 
 
 def zoom(x: ArrayLike, band: tuple[float, float], m: int | None = None, fs: float = 1.0,

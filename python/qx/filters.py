@@ -93,7 +93,9 @@ class Filter:
 
     def __init__(self, b: Any, a: Any, is_cascade: Any, fs: Any = 1.0, title: Any = "",
                  main: Any = None) -> None:
-        self._b, self._a = np.asarray(b, float), np.asarray(a, float)
+        self.is_complex = bool(np.iscomplexobj(b) or np.iscomplexobj(a))
+        kind = complex if self.is_complex else float
+        self._b, self._a = np.asarray(b, kind), np.asarray(a, kind)
         self._b.flags.writeable = self._a.flags.writeable = False
         self._is_cascade, self.fs, self.title = is_cascade, float(fs), title
         self._main = main  # a frequency of the pass band, in cycles per sample
@@ -128,11 +130,16 @@ class Filter:
         return either(self._run, self._run_complex, x, axis)
 
     def _run(self, x: Any) -> Any:
+        if self.is_complex:
+            rest, rest_complex = self._rest[0], self._rest_complex[1]
+            return core.Filter_complex_of_real(x, self._a, self._b, rest, rest_complex, 0)[0]
         if self._is_cascade:
             return core.Filter_cascade(x, 0, self._a, self._b, *self._rest, 0)[0]
         return core.Filter_direct(x, self._a, self._b, *self._rest, 0)[0]
 
     def _run_complex(self, x: Any) -> Any:
+        if self.is_complex:
+            return core.Filter_complex(x, self._a, self._b, *self._rest_complex, 0)[0]
         if self._is_cascade:
             return core.Filter_cascade_complex(x, 0, self._a, self._b, *self._rest_complex, 0)[0]
         return core.Filter_direct_complex(x, self._a, self._b, *self._rest_complex, 0)[0]
@@ -191,7 +198,9 @@ class Filter:
         long = np.pad(x, pad, "edge") if kind == "constant" else \
             np.pad(x, pad, "reflect", reflect_type=kind) if kind else x
         there = self._from_rest(long)
-        back = self._from_rest(there[::-1])
+        # Backwards with the conjugate, so that the magnitude is squared and no phase stays.
+        behind = Filter(self._b.conj(), self._a.conj(), False) if self.is_complex else self
+        back = behind._from_rest(there[::-1])
         return back[::-1][pad:pad + len(x)]
 
     def _from_rest(self, x: Any) -> Any:
@@ -238,12 +247,12 @@ class Filter:
     # What it is
 
     @property
-    def is_iir(self) -> Any:
+    def is_iir(self) -> bool:
         """Whether it has a feedback."""
         return bool(len(self._a) > (0 if self._is_cascade else 1) and np.any(self._a[not self._is_cascade:]))
 
     @property
-    def sos(self) -> Any:
+    def sos(self) -> NDArray[Any]:
         """The second-order sections, one to a row: b0, b1, b2, 1, a1, a2, as of SciPy."""
         if self._is_cascade:
             b, a = self._b.reshape(-1, 3), self._a.reshape(-1, 2)
@@ -255,7 +264,7 @@ class Filter:
         return np.r_[np.r_[self._b, np.zeros(3 - len(self._b))], a][None] / a[0]
 
     @property
-    def ba(self) -> Any:
+    def ba(self) -> tuple[NDArray[Any], NDArray[Any]]:
         """Numerator and denominator in ascending powers of 1/z. Of a high order they lose digits;
         `sos` does not."""
         if not self._is_cascade:
@@ -266,7 +275,7 @@ class Filter:
         return b, a
 
     @property
-    def taps(self) -> Any:
+    def taps(self) -> NDArray[Any]:
         """The impulse response of a filter without feedback."""
         if self.is_iir:
             refuse("filters.Filter.taps", "self", "a filter with feedback has no end of taps",
@@ -290,22 +299,22 @@ class Filter:
         return np.concatenate([*found, np.empty(0, complex)])
 
     @property
-    def poles(self) -> Any:
+    def poles(self) -> NDArray[np.complex128]:
         """The poles in the z plane; a filter without feedback has them all at 0."""
         return self._roots(1)
 
     @property
-    def zeros(self) -> Any:
+    def zeros(self) -> NDArray[np.complex128]:
         """The zeros in the z plane."""
         return self._roots(0)
 
     @property
-    def is_stable(self) -> Any:
+    def is_stable(self) -> bool:
         """Whether all poles are inside the unit circle."""
         return bool(np.all(np.abs(self.poles) < 1))
 
     @property
-    def delay(self) -> Any:
+    def delay(self) -> float:
         """The group delay in samples: the one of all frequencies where the taps are symmetric, else that
         in the middle of the pass band. `response().delay` has it for each frequency."""
         if not self.is_iir:
@@ -384,6 +393,9 @@ class Filter:
         """Both filters one after the other."""
         if not isinstance(other, Filter):
             return NotImplemented
+        if self.is_complex or other.is_complex:
+            (b, a), (c, d) = self.ba, other.ba
+            return from_ba(np.convolve(b, c), np.convolve(a, d), self.fs)
         return from_sos(np.vstack([self.sos, other.sos]), self.fs)
 
     def __repr__(self) -> str:
@@ -419,9 +431,11 @@ def _roots(descending: Any) -> Any:
     at_zero = len(descending) - len(np.trim_zeros(descending, "b")) if degree >= 0 else 0
     if degree < 1:
         return np.zeros(at_zero, complex)
-    companion = np.eye(degree, k=-1)
+    companion = np.eye(degree, k=-1, dtype=kept.dtype)
     companion[0] = -kept[1:] / kept[0]
-    return np.r_[core.Filter_roots(companion, 0)[0], np.zeros(at_zero)]
+    values, _ = core.Filter_roots_complex(companion, 0, 0) if kept.dtype.kind == "c" else \
+        core.Filter_roots(companion, 0)
+    return np.r_[values, np.zeros(at_zero)]
 
 
 class FilterStream(Stream):
@@ -434,6 +448,8 @@ class FilterStream(Stream):
     def __init__(self, filter_: Any, channels: Any = None, axis: Any = -1, dtype: Any = float,
                  value: Any = 0.0) -> None:
         self.filter, self._value = filter_, value
+        if filter_.is_complex:
+            self._output = complex
         super().__init__(channels, axis, dtype)
 
     def _start(self) -> Any:
@@ -443,8 +459,9 @@ class FilterStream(Stream):
             b, a = f.ba
             gain = b.sum() / a.sum() if value and a.sum() else 0.0
             feedback = len(f._a) - 1 if len(f._a) else 0
+            kind = complex if f.is_complex else self.dtype
             return (np.full(max(len(b) - 1, 0), value, self.dtype),
-                    np.full(feedback, value * gain, self.dtype))
+                    np.full(feedback, value * gain, kind))
         state = []
         for row in f.sos if value else ():
             total = row[3:].sum()
@@ -458,7 +475,10 @@ class FilterStream(Stream):
         if f._is_cascade:
             run = core.Filter_cascade_complex if is_complex else core.Filter_cascade
             return run(block, 0, f._a, f._b, state, 1)
-        run = core.Filter_direct_complex if is_complex else core.Filter_direct
+        if f.is_complex:
+            run = core.Filter_complex if is_complex else core.Filter_complex_of_real
+        else:
+            run = core.Filter_direct_complex if is_complex else core.Filter_direct
         found, *states = run(block, f._a, f._b, *state, 1)
         return found, states
 
@@ -920,7 +940,7 @@ def from_ba(b: ArrayLike, a: ArrayLike = (1.0,), fs: float = 1.0) -> Filter:
     Parameters
     ----------
     b, a : array_like
-        Coefficients in ascending powers of 1/z.
+        Coefficients in ascending powers of 1/z, real or complex; with complex ones the output is complex.
     fs : float
         The sampling rate.
 
@@ -939,7 +959,7 @@ def from_ba(b: ArrayLike, a: ArrayLike = (1.0,), fs: float = 1.0) -> Filter:
     >>> qx.filters.from_ba([0.5], [1, -0.5])([1.0, 0.0, 0.0])
     array([0.5  , 0.25 , 0.125])
     """
-    b, a = vector(b, "filters.from_ba", "b").astype(float), vector(a, "filters.from_ba", "a").astype(float)
+    b, a = vector(b, "filters.from_ba", "b"), vector(a, "filters.from_ba", "a")
     if not len(b) or not len(a) or a[0] == 0:
         refuse("filters.from_ba", "b, a", "b must have a coefficient, and a must not begin with 0",
                "ErrBadCoefficients")

@@ -133,6 +133,36 @@ class Fit(Result):
         return {name: (float(value), float(value)) if is_fixed else tuple(map(float, next(free)))
                 for (name, value), is_fixed in zip(self.parameters.items(), self._fixed)}
 
+    def derived(self, f: Callable[..., Any]) -> tuple[Any, Any]:
+        r"""What follows from the parameters, with its standard error, to first order (the law of
+        propagation of uncertainty in the "Guide to the expression of uncertainty in measurement", 2008).
+
+        .. math:: u^2 = \sum_{jk} \frac{\partial f}{\partial p_j} \frac{\partial f}{\partial p_k} C_{jk}
+
+        Parameters
+        ----------
+        f : callable
+            Takes the parameters by their order; returns a number or an array.
+
+        Returns
+        -------
+        value, error : float or ndarray
+
+        Examples
+        --------
+        >>> import numpy as np, qx
+        >>> x = np.linspace(0, 3, 50)
+        >>> y = 2 * np.exp(-0.7 * x) + qx.noise.gaussian(50, 0.01, seed=1)
+        >>> half, error = qx.fit.exponential(x, y).derived(lambda a, b, c: -np.log(2) / b)
+        >>> bool(abs(half - np.log(2) / 0.7) < 3 * error < 0.15)
+        True
+        """
+        p = np.array([*self.parameters.values()])
+        # Of a model without x, whose values are those of f.
+        slopes = _Model("", self.parameters, lambda _, p: np.asarray(f(*p), float)).jacobian(None, p)
+        variance = np.einsum("...j,jk,...k", slopes, self.covariance, slopes)
+        return np.asarray(f(*p), float)[()], np.sqrt(np.maximum(variance, 0.0))[()]
+
     def _bounds(self, bounds: Any, x: Any, level: Any) -> Any:
         """The export's bounds of the model that is linearised at the parameters, at the samples and at x."""
         if not 0 < level < 1:

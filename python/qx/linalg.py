@@ -20,7 +20,8 @@ from .topical.axes import as_array, many
 
 __all__ = ["Eigen", "GSVD", "Hessenberg", "LU", "LeastSquares", "QR", "QZ", "SVD", "Schur", "balance",
            "charpoly", "cholesky", "companion", "cond", "det", "eig", "eigh", "eigvals",
-           "eigvalsh", "expm", "gsvd", "hessenberg", "inv", "is_positive_definite",
+           "eigvalsh", "expm", "from_eigenvalues", "gsvd", "hessenberg", "inv", "is_positive_definite",
+           "is_positive_semidefinite",
            "is_symmetric", "kron", "logm", "lstsq", "lu", "matrix_power", "matrix_rank",
            "norm", "pinv", "qr", "qz", "schur", "solve", "solve_banded",
            "solve_discrete_lyapunov", "solve_lyapunov", "solve_sylvester", "sqrtm", "svd",
@@ -1357,6 +1358,69 @@ def is_positive_definite(a: ArrayLike) -> bool:
     True
     """
     return bool(_served("is_positive_definite", _matrix("linalg.is_positive_definite", a, True))(as_array(a)))
+
+
+def is_positive_semidefinite(a: ArrayLike, tolerance: float | None = None) -> bool:
+    """Whether a matrix is symmetric (Hermitian) without eigenvalues below 0, within a tolerance, by
+    symmetric elimination that takes the largest diagonal element first.
+
+    Parameters
+    ----------
+    a : array_like
+        A square matrix, real or complex.
+    tolerance : float, optional
+        Relative to the largest diagonal element; 2.2e-16 times the order by default.
+
+    Returns
+    -------
+    bool
+
+    Raises
+    ------
+    numpy.linalg.LinAlgError
+        If a is not square.
+    ValueError
+        If a is empty or has an element that is not finite, or the tolerance is negative.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.linalg.is_positive_semidefinite([[1.0, 1.0], [1.0, 1.0]])
+    True
+    """
+    a = _matrix("linalg.is_positive_semidefinite", a, True)
+    if tolerance is not None and not tolerance >= 0:
+        refuse("linalg.is_positive_semidefinite", "tolerance", f"must not be negative; {tolerance} came",
+               "ErrNegativeSetting")
+    return bool(_served("is_positive_semidefinite", a)(a, -1.0 if tolerance is None else float(tolerance))[0])
+
+
+def from_eigenvalues(values: ArrayLike) -> NDArray[np.float64]:
+    r"""A full symmetric matrix that has the given eigenvalues, for tests.
+
+    .. math:: Q \operatorname{diag}(\lambda)\, Q, \quad Q = 1 - \frac{2}{n} e e^T
+
+    Parameters
+    ----------
+    values : array_like
+        The eigenvalues, real.
+
+    Returns
+    -------
+    ndarray of float64
+
+    Raises
+    ------
+    ValueError
+        If there is no value.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.linalg.eigvalsh(qx.linalg.from_eigenvalues([3.0, 1.0, 2.0])).round(12)
+    array([1., 2., 3.])
+    """
+    return core.from_eigenvalues(as_array(values))
 
 
 def is_symmetric(a: ArrayLike, tolerance: float = 0.0) -> bool:

@@ -13,9 +13,9 @@ from numpy.typing import ArrayLike, DTypeLike, NDArray
 
 from .topical import LAST, Stream, along, chosen, either, refuse, served, vector, whole_number
 
-__all__ = ["Decimator", "FrequencyShift", "MovingSum", "Resampler", "cic_decimate", "cic_interpolate",
-           "decimate", "low_pass", "moving_average", "moving_sum", "resample", "respace",
-           "shift_frequency"]
+__all__ = ["Decimator", "FrequencyShift", "InterpolatedFIR", "MovingSum", "Resampler", "cic_decimate", "cic_interpolate",
+           "decimate", "interpolated_fir", "low_pass", "moving_average", "moving_sum", "resample", "resample_at",
+           "respace",           "shift_frequency"]
 
 EMPTY = np.empty(0)
 core = served("multirate")
@@ -229,6 +229,154 @@ def respace(x: ArrayLike, spacing: float, start: float = 0.0, axis: int = LAST) 
         return found[:min(count, made)]
 
     return along(of_channel, x, axis)
+
+
+def resample_at(x: ArrayLike, times: ArrayLike, fs: float = 1.0, anti_alias: bool = False,
+                axis: int = LAST) -> NDArray[Any]:
+    """The signal at any times, which need not be evenly spaced, by the kernel of `respace`. Before the first
+    and behind the last sample the signal is 0.
+
+    Parameters
+    ----------
+    x : array_like
+        Real or complex values.
+    times : array_like
+        Of the new values, from the first sample, in any order; rising for anti_alias.
+    fs : float
+        The sampling rate of x.
+    anti_alias : bool
+        Take away what would fold back where times are further apart than samples: the kernel is
+        stretched by the gap before each time.
+    axis : int
+        The axis of time.
+
+    Returns
+    -------
+    ndarray
+
+    Raises
+    ------
+    ValueError
+        If x is empty, fs is not above 0, a time is not finite, or times do not rise with anti_alias.
+
+    Examples
+    --------
+    >>> import numpy as np, qx
+    >>> times = np.array([0.2, 0.203, 0.2061])
+    >>> found = qx.multirate.resample_at(qx.signals.sine(400, 7.0, fs=1000), times, fs=1000)
+    >>> bool(abs(found - np.sin(2 * np.pi * 7 * times)).max() < 1e-5)
+    True
+    """
+    name = "multirate.resample_at"
+    if not fs > 0:
+        refuse(name, "fs", f"must be above 0; {fs} came", "ErrSamplingNotPositive")
+    at = vector(times, name, "times") * float(fs)
+    if not np.all(np.isfinite(at)):
+        refuse(name, "times", "must be finite", "ErrNonFiniteInput")
+    gaps = np.diff(at)
+    if anti_alias and np.any(gaps <= 0):
+        refuse(name, "times", "must rise for anti_alias", "ErrAbscissaeOrder")
+    design = {"mode": 0, "antiAlias": int(anti_alias), "proto": _kernel(), "oversample": OVERSAMPLE}
+    stretch = min(max(gaps.max(initial=1.0), 1.0), OVERSAMPLE) if anti_alias else 1.0
+    behind = math.ceil(stretch * (HALF_KERNEL + 2)) + 2
+
+    def of_channel(channel: Any) -> Any:
+        if not len(channel):
+            refuse(name, "x", "is empty", "ErrEmptyInput")
+        is_complex = channel.dtype.kind == "c"
+        # What reads only zeros need not be read: times far away become the next ones that do.
+        clipped = np.clip(at, -behind, len(channel) - 1 + behind) if not anti_alias else at
+        reach = max(math.ceil(clipped.max(initial=0.0)) + behind - len(channel), 0)
+        long = np.concatenate([channel, np.zeros(reach, channel.dtype)])
+        run = core.resample_at_complex if is_complex else core.resample_at
+        last = at[0] - (gaps[0] if len(gaps) else 1.0) if len(at) else 0.0
+        found, _, made, _ = run(long, clipped.astype(complex) if is_complex else clipped, design, float(last))
+        assert made == len(at)
+        return found
+
+    return along(of_channel, x, axis)
+
+
+class InterpolatedFIR(Stream):
+    """The stream of `interpolated_fir`.
+
+    Parameters
+    ----------
+    taps : array_like
+        The taps, real.
+    spacing : int
+        How many samples they are apart.
+    channels : int, optional
+        How many channels a block of two dimensions has; without it blocks have one dimension.
+    axis : int
+        The axis of time in a block of two dimensions.
+
+    Examples
+    --------
+    >>> import qx
+    >>> stream = qx.multirate.InterpolatedFIR([1.0, -1.0], 2)
+    >>> stream([1.0, 2.0, 4.0]), stream([8.0])
+    (array([1., 2., 3.]), array([6.]))
+    """
+
+    dtypes = (np.dtype(float),)
+
+    def __init__(self, taps: ArrayLike, spacing: int, channels: int | None = None, axis: int = -1) -> None:
+        self.taps = vector(taps, "multirate.InterpolatedFIR", "taps").astype(float)
+        if not len(self.taps):
+            refuse("multirate.InterpolatedFIR", "taps", "are empty", "ErrOrderNotPositive")
+        self.spacing = whole_number("multirate.InterpolatedFIR", "spacing", spacing, 1, "ErrNotStrictlyPositive")
+        super().__init__(channels, axis)
+
+    def _start(self) -> Any:
+        return np.zeros((len(self.taps) - 1) * self.spacing)
+
+    def _step(self, state: Any, block: Any) -> Any:
+        found, state, _ = core.InterpolatedFIR(block, self.spacing, 1.0, self.taps, state, 0, 0)
+        return found, state
+
+
+def interpolated_fir(x: ArrayLike, taps: ArrayLike, spacing: int, axis: int = LAST) -> NDArray[Any]:
+    r"""A filter whose taps are several samples apart: a sharp filter of few taps, whose passband repeats
+    at multiples of 1 / spacing (interpolated FIR filter).
+
+    .. math:: y_i = \sum_k h_k x_{i - k L}
+
+    Y. Neuvo, C.-Y. Dong and S. K. Mitra, "Interpolated finite impulse response filters", 1984.
+
+    Parameters
+    ----------
+    x : array_like
+        Real or complex values.
+    taps : array_like
+        The taps, real.
+    spacing : int
+        How many samples they are apart.
+    axis : int
+        The axis of time.
+
+    Returns
+    -------
+    ndarray
+        Of the shape of x.
+
+    Raises
+    ------
+    ValueError
+        If there is no tap, or spacing is below 1.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.multirate.interpolated_fir([1.0, 2.0, 4.0, 8.0], [1.0, -1.0], 2)
+    array([1., 2., 3., 6.])
+    """
+    stream = InterpolatedFIR(taps, spacing)
+
+    def of_real(channel: Any) -> Any:
+        return stream.copy()(channel)
+
+    return either(of_real, lambda channel: of_real(channel.real) + 1j * of_real(channel.imag), x, axis)
 
 
 def _kernel() -> Any:

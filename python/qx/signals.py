@@ -16,9 +16,9 @@ from .topical import LAST, along, chosen, refuse, served, vector, whole_number
 from .topical.axes import as_array
 
 __all__ = ["arbitrary", "autocorrelate", "chirp", "convolve", "convolve2", "correlate", "correlate2",
-           "deconvolve", "detrend", "frequency_modulated", "gauss_monopulse", "gauss_pulse", "impulse",
-           "periodic_sinc", "phase_modulated", "pulse", "ramp", "rescale", "sawtooth", "sinc", "sine",
-           "square", "standardize", "triangle", "triangle_pulse", "unwrap"]
+           "correlation_matrix", "deconvolve", "detrend", "frequency_modulated", "gauss_monopulse",
+           "gauss_pulse", "impulse", "periodic_sinc", "phase_modulated", "pulse", "ramp", "rescale",
+           "sawtooth", "sinc", "sine", "square", "standardize", "triangle", "triangle_pulse", "unwrap"]
 
 core = served("signals")
 
@@ -884,6 +884,46 @@ def autocorrelate(x: ArrayLike, normalization: Literal["none", "unbiased", "bias
     """
     norm = chosen("signals.autocorrelate", "normalization", normalization, NORMALIZATIONS)
     return along(lambda channel: core.autocorrelate(channel, norm), x, axis)
+
+
+def correlation_matrix(x: ArrayLike, max_lag: int, y: ArrayLike | None = None,
+                       normalization: Literal["none", "unbiased", "biased"] = "none") -> NDArray[Any]:
+    r"""The correlation matrix of order max_lag + 1, a Toeplitz matrix.
+
+    .. math:: R_{ij} = r(i - j), \quad r(k) = \sum_l x_{l+k}\, \overline{y_l}
+
+    Parameters
+    ----------
+    x : array_like
+        Real or complex values.
+    max_lag : int
+        The largest lag, at least 0 and below the number of values.
+    y : array_like, optional
+        As many values; x by default, which makes the matrix symmetric (Hermitian).
+    normalization : {"none", "unbiased", "biased"}
+        As of `correlate`.
+
+    Returns
+    -------
+    ndarray
+
+    Raises
+    ------
+    ValueError
+        If the arrays are empty or differ in length, max_lag is out of range, or normalization is none of
+        its words.
+
+    Examples
+    --------
+    >>> import qx
+    >>> qx.signals.correlation_matrix([1.0, 2.0, 0.0], 1)
+    array([[5., 2.],
+           [2., 5.]])
+    """
+    x, y, is_complex = _both("signals.correlation_matrix", x, x if y is None else y)
+    most = whole_number("signals.correlation_matrix", "max_lag", max_lag, 0, "ErrIndexOutOfRange")
+    norm = chosen("signals.correlation_matrix", "normalization", normalization, NORMALIZATIONS)
+    return (core.correlation_matrix_complex if is_complex else core.correlation_matrix)(x, y, most, norm)
 
 
 def deconvolve(xy: ArrayLike, y: ArrayLike) -> NDArray[np.float64]:

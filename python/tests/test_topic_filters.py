@@ -193,6 +193,37 @@ class Streams(unittest.TestCase):
         self.assertRaisesRegex(TypeError, "complex128 came", f.stream(), [1j])
 
 
+class ComplexCoefficients(unittest.TestCase):
+    """A passband on one side of 0."""
+
+    b, a = np.array(scipy.signal.butter(4, 0.2)) * np.exp(0.6j * np.pi * np.arange(5))
+    f = filters.from_ba(b, a)
+
+    def test_signals(self):
+        x = RNG.normal(size=(2, 300))
+        for given in (x, x + 1j * x[::-1]):
+            close(self.f(given), scipy.signal.lfilter(self.b, self.a, given))
+            close(filters.from_ba(self.b)(given), scipy.signal.lfilter(self.b, 1, given))
+            for axis, blocks in ((-1, given), (0, given.T)):
+                stream = self.f.stream(2, axis, given.dtype.type)
+                found = [stream(part) for part in np.split(blocks, [1, 7, 200], axis)]
+                np.testing.assert_array_equal(np.concatenate(found, axis), self.f(blocks, axis=axis))
+        tone = np.exp(1j * np.pi * np.outer([0.6, -0.6], np.arange(300)))
+        close(np.abs(self.f.zero_phase(tone)[:, 150]), [1, 0], 0, 1e-6)
+        close(self.f.zero_phase(tone)[0, 100:200], tone[0, 100:200], 1e-6)
+        self.assertEqual(pickle.loads(pickle.dumps(self.f))(x).dtype, complex)
+
+    def test_what_it_is(self):
+        w, expected = scipy.signal.freqz(self.b, self.a, np.linspace(-3, 3, 50))
+        close(self.f.response(w / 2 / np.pi).values, expected)
+        roots = scipy.signal.tf2zpk(self.b, self.a)
+        for found, due in zip((self.f.zeros, self.f.poles), roots):
+            close(np.sort(np.angle(found)), np.sort(np.angle(due)), 0, 1e-3)  # a zero of order 4
+        close(np.sort_complex(self.f.poles), np.sort_complex(roots[1]), 1e-6)
+        close((self.f * filters.from_ba([1, 1j])).ba[0], np.convolve(self.b, [1, 1j]))
+        self.assertTrue(self.f.is_stable)
+
+
 class Smoothing(unittest.TestCase):
     def test_savgol(self):
         x = RNG.normal(size=(3, 60))
@@ -269,6 +300,17 @@ class Transforms(unittest.TestCase):
         close(getattr(qx.fft, name)(x, n, axis, norm), getattr(np.fft, name)(x, n, axis, norm), 1e-10, 1e-11)
         if name == "fft":
             close(qx.fft.fft(x.real, n, axis, norm), np.fft.fft(x.real, n, axis, norm), 1e-10, 1e-11)
+
+    @hypothesis.given(strategies.integers(1, 90), strategies.integers(1, 120), strategies.integers(-99, 99),
+                      strategies.integers(1, 30), strategies.booleans(), strategies.integers(0, 1))
+    @hypothesis.settings(max_examples=60, deadline=None)
+    def test_a_band_of_bins(self, length, n, start, size, is_complex, axis):
+        x = RNG.normal(size=(length, 2) if axis == 0 else (2, length))
+        x = x + 1j * x[::-1] if is_complex else x
+        before = x.copy()
+        due = np.take(np.fft.fft(x, n, axis), np.arange(start, start + size) % n, axis)
+        close(qx.fft.dzt(x, start, size, n, axis), due, 0, 1e-12 * n)
+        np.testing.assert_array_equal(x, before)
 
     def test_the_others(self):
         x = RNG.normal(size=(4, 15))

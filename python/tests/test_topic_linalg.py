@@ -173,6 +173,18 @@ class Decompositions(unittest.TestCase):
         close(linalg.toeplitz([1, 2, 3], [1, 5j, 6]), scipy.linalg.toeplitz([1, 2, 3], [1, 5j, 6]))
         self.assertIn("values   [", repr(linalg.eigh(a + a.T)))
 
+    def test_given_eigenvalues(self):
+        for values in ([3.0, 0.0, 5.0], [3.0, -1e-3, 5.0], [-2.0], [0.0]):
+            a = linalg.from_eigenvalues(values)
+            close(np.linalg.eigvalsh(a), np.sort(values))
+            turned = np.linalg.qr(some(len(values), len(values), is_complex=True))[0]
+            for one in (a, turned @ a @ turned.conj().T):
+                self.assertEqual(linalg.is_positive_semidefinite(one, 1e-9), min(values) >= 0, values)
+        self.assertFalse(linalg.is_positive_semidefinite([[1.0, 2.0], [0.0, 5.0]]), "not symmetric")
+        self.assertTrue(linalg.is_positive_semidefinite([[1.0, 0.5], [0.4, 1.0]], 0.1))
+        self.assertRaisesRegex(ValueError, "tolerance", linalg.is_positive_semidefinite, [[1.0]], -1.0)
+        self.assertRaises(np.linalg.LinAlgError, linalg.is_positive_semidefinite, [[1.0, 2.0]])
+
     def test_functions_and_equations(self):
         a = 0.3 * some(4, 4) + 2 * np.eye(4)
         close(linalg.expm(a), scipy.linalg.expm(a), 1e-6)

@@ -154,6 +154,17 @@ class Signals(unittest.TestCase):
             close(signals.correlate(x, y, mode, method), scipy.signal.correlate(x, y, mode, "direct"), 1e-9,
                   1e-10)
 
+    def test_correlation_matrices(self):
+        x, y = RNG.normal(size=(2, 30))
+        for one, other in ((x, y), (x + 1j * y, y - 2j * x)):
+            full = signals.correlate(one, other)
+            lags = np.subtract.outer(np.arange(4), np.arange(4))
+            close(signals.correlation_matrix(one, 3, other), full[29 + lags])
+            own = signals.correlation_matrix(one, 3, normalization="biased")
+            close(own, own.conj().T)
+            close(own[0, 0], np.mean(np.abs(one)**2))
+        self.assertRaises(ValueError, signals.correlation_matrix, x, 30)
+
     def test_more_of_it(self):
         x, y = RNG.normal(size=(7, 9)), RNG.normal(size=(3, 4))
         for mode in ("full", "valid"):
@@ -233,6 +244,36 @@ class Multirate(unittest.TestCase):
         self.assertEqual(multirate.respace([1.0, 2.0], 1.0, 5.0).size, 0)
         for wrong in ({"spacing": 0}, {"spacing": 1, "start": -1}):
             self.assertRaises(ValueError, multirate.respace, [1.0], **wrong)
+
+    def test_any_times(self):
+        times = np.array([40.0, 50.25, 50.2501, 49.9, 61.7, 300.3])
+        tones = np.array([0.03, 0.2, 0.38])
+
+        def at(t):
+            return np.exp(2j * np.pi * np.outer(tones, t))
+
+        x = at(np.arange(400))
+        for is_complex in (True, False):
+            given, due = (x, at(times)) if is_complex else (x.imag, at(times).imag)
+            close(multirate.resample_at(given, times), due, 0, 5e-5)
+            close(multirate.resample_at(given.T, times / 10, 10, axis=0), due.T, 0, 5e-5)
+        close(multirate.resample_at(x.imag, np.arange(5.5, 390)), multirate.respace(x.imag, 1.0, 5.5)[:, :385], 0, 1e-12)
+        self.assertEqual(multirate.resample_at(x[0], [-1e300, 1e6]).tolist(), [0, 0])
+        # Only what is below half the new rate stays.
+        sparse = np.arange(100, 300, 4.0)
+        close(multirate.resample_at(x, sparse, anti_alias=True)[0], at(sparse)[0], 0, 1e-4)
+        self.assertLess(np.abs(multirate.resample_at(x, sparse, anti_alias=True)[1:]).max(), 2e-4)
+        for times, reason in (([1.0, np.nan], "finite"), ([[1.0]], "one dimension"), ([2.0, 1.0], "must rise")):
+            self.assertRaisesRegex(ValueError, reason, multirate.resample_at, x, times, anti_alias=True)
+
+    def test_taps_apart(self):
+        h, x = RNG.normal(size=5), RNG.normal(size=(3, 60))
+        spread = np.zeros(13)
+        spread[::3] = h
+        for given in (x, x + 1j * x[::-1]):
+            close(multirate.interpolated_fir(given, h, 3), scipy.signal.lfilter(spread, 1, given))
+        self.assertRaisesRegex(ValueError, "spacing", multirate.interpolated_fir, x, h, 0)
+        self.assertRaisesRegex(ValueError, "taps", multirate.interpolated_fir, x, [], 1)
 
     def test_single_precision_stays(self):
         x = RNG.normal(size=(2, 300))

@@ -39,7 +39,7 @@ WRONG = {
     'qx.Moment_head([1.0], "2")': "incompatible type",
     "qx.exports.Moment_head([1.0])": "Missing positional argument",
     "qx.Moment_tail([1.0], 2)": "has no attribute",
-    "qx.spectra.welch([1.0], fs=1000).amplitude": "has no attribute",
+    "qx.spectra.welch([1.0], fs=1000).heights": "has no attribute",
 }
 
 

@@ -7,6 +7,7 @@ side while the exports work.
 
 from __future__ import annotations
 
+import math
 import os
 import threading
 from concurrent.futures import ThreadPoolExecutor
@@ -113,21 +114,27 @@ def along(function: Channel, x: ArrayLike, axis: int = LAST) -> Any:
     return _along(function, as_array(x), axis)
 
 
-def _check_axis(x: NDArray[Any], axis: int) -> None:
-    if x.ndim == 0:
+def _check_axis(dimensions: int, axis: int) -> None:
+    if not dimensions:
         raise ValueError("an array of at least one dimension is needed; a single number came")
-    if not -x.ndim <= axis < x.ndim:
-        raise ValueError(f"axis {int(axis)} is none of an array of {x.ndim} dimension{'s'[:x.ndim - 1]}")
-    if x.ndim > 1 and not x.size and 0 in np.delete(x.shape, axis):
+    if not -dimensions <= axis < dimensions:
+        raise ValueError(f"axis {int(axis)} is none of an array of {dimensions} dimension{'s'[:dimensions - 1]}")
+
+
+def _flat(x: NDArray[Any], axis: int) -> tuple[NDArray[Any], NDArray[Any]]:
+    """The channels in rows, and x with the axis as the last one."""
+    moved = np.moveaxis(x, axis, -1)
+    flat = moved.reshape(math.prod(moved.shape[:-1]), moved.shape[-1])
+    if not len(flat):
         raise ValueError(f"an array of shape {x.shape} has no channel along axis {int(axis)}")
+    return flat, moved
 
 
 def _along(function: Channel, x: NDArray[Any], axis: int) -> Any:
-    _check_axis(x, axis)
+    _check_axis(x.ndim, axis)
     if x.ndim == 1:
         return function(x)
-    moved = np.moveaxis(x, axis, -1)
-    flat = moved.reshape(-1, moved.shape[-1])
+    flat, moved = _flat(x, axis)
     found = many(function, flat, x.size)
     place = axis % x.ndim
     if isinstance(found[0], tuple):
@@ -143,9 +150,9 @@ def by_channel(function: Channel, x: ArrayLike, axis: int = LAST) -> Any:
     x = as_array(x)
     if x.ndim == 1 and axis in (-1, 0):
         return function(x)
-    _check_axis(x, axis)
-    moved = np.moveaxis(x, axis, -1)
-    found = many(function, moved.reshape(-1, moved.shape[-1]), x.size)
+    _check_axis(x.ndim, axis)
+    flat, moved = _flat(x, axis)
+    found = many(function, flat, x.size)
     for count in moved.shape[-2:0:-1]:
         found = [found[first:first + count] for first in range(0, len(found), count)]
     return found
@@ -158,7 +165,7 @@ def along_pairs(function: Callable[[NDArray[Any], NDArray[Any]], float], x: Arra
     places = [0 if axis is LAST and is_pandas(one) else axis for one in (x, y)]
     arrays = [as_array(one) for one in (x, y)]
     for one, place in zip(arrays, places):
-        _check_axis(one, 0 if one.ndim == 1 else place)  # a single channel has one axis
+        _check_axis(one.ndim, 0 if one.ndim == 1 else place)  # a single channel has one axis
     moved = [one if one.ndim == 1 else np.moveaxis(one, place, -1) for one, place in zip(arrays, places)]
     shape = np.broadcast_shapes(*(one.shape[:-1] for one in moved))
     rows = [np.broadcast_to(one, (*shape, one.shape[-1])).reshape(-1, one.shape[-1]) for one in moved]
@@ -190,8 +197,7 @@ def either(real: Channel, of_complex: Channel, x: Any, axis: int = LAST) -> Any:
 def count_of(x: ArrayLike, axis: int = LAST) -> int:
     """How many values a channel has."""
     shape = np.shape(x)
-    if not shape:
-        raise ValueError("an array of at least one dimension is needed; a single number came")
+    _check_axis(len(shape), axis)
     return shape[0 if axis is LAST and is_pandas(x) else axis]
 
 

@@ -25,7 +25,9 @@ NEWEST = {
         "windowed": "FIRCoefs", "windowed_window": "AllWinH", "equiripple": "Parks",
         "Filter_cascade": "IIR_Filter2", "Filter_cascade_complex": "CxSigIIR_Filter2",
         "Filter_direct": "IIR_Filter", "Filter_direct_complex": "CxSigIIR_Filter",
-        "Filter_roots": "EigenValueVector_head", "Filter_polynomial": "CxPolyEv",
+        "Filter_complex": "CxIIR_Filter_H", "Filter_complex_of_real": "CxIIRReSig_Filter_H",
+        "Filter_roots": "EigenValueVector_head", "Filter_roots_complex": "CxEigenValueVector_head",
+        "Filter_polynomial": "CxPolyEv",
         "savgol": "SavitzkyGolayFiltH", "savgol_coefficients": "SavitzkyGolayCoefH",
         "median": "MedianFilter81_H",
     },
@@ -36,6 +38,7 @@ NEWEST = {
         "ifft2": "CxInvFFT2D_H", "dct": "DCT_1DH", "idct": "InvDCT_1DH", "dst": "DST_1DH",
         "idst": "InvDST_1DH", "hartley": "FHTH", "ihartley": "InvFHTH",
         "hilbert": "FastHilbertTransformH", "ihilbert": "InvFastHilbertTransformH",
+        "dzt": "ReDZTH", "dzt_complex": "CxDZTH",
         "czt": "ChirpZT_head", "czt_complex": "CxChirpZT_head", "iczt": "InvChirpZT_head",
         "half_complex": "ReOXFFTHCH", "ihalf_complex": "InvReOXFFTHCH",
     },
@@ -60,7 +63,9 @@ NEWEST = {
         "autocorrelate": "AutoCorrelation80", "deconvolve": "Deconvolution",
         "convolve2": "Convolve_2DH", "convolve2_complex": "CxConvolve_2DH",
         "correlate2": "Correlation_2DH", "correlate2_complex": "CxCorrelation_2DH",
-        "detrend": "PolyFit81_head", "standardize": "Norm1", "rescale": "Scale1DCIN",
+        "detrend": "PolyFit81_head", "correlation_matrix": "AutoCorrMtrxH",
+        "correlation_matrix_complex": "CxAutoCorrMtrxH",
+        "standardize": "Norm1", "rescale": "Scale1DCIN",
     },
     "noise": {
         "uniform": "white", "gaussian": "Gauss", "periodic": "PeriodNoise", "gamma": "GammaNoiseH",
@@ -68,6 +73,8 @@ NEWEST = {
     },
     "multirate": {
         "respace": "Resample_Const", "respace_complex": "CxResample_Const",
+        "resample_at": "Resample_Variable", "resample_at_complex": "CxResample_Variable",
+        "InterpolatedFIR": "InterpolatedFIRH",
         "resample": "ppMultiRateFIRH_DBL", "resample_single": "ppMultiRateFIRH_SGL",
         "resample_complex": "ppMultiRateFIRH_CDB", "resample_complex_single": "ppMultiRateFIRH_CSG",
         "decimate": "DecimateContinuous_H", "decimate_complex": "CxDecimateContinuous_H",
@@ -107,7 +114,9 @@ NEWEST = {
         "CxBandEqsDriH", "solve_banded_many": "BandEqsSetDriH", "solve_banded_many_complex":
         "CxBandEqsSetDriH", "charpoly": "MatrixCharacteristicPoly_head", "charpoly_complex":
         "CxMatrixCharacteristicPoly_head", "is_positive_definite": "CheckPosdef_head",
-        "is_positive_definite_complex": "CxCheckPosdef_head", "kron": "KroneckerProd_H",
+        "is_positive_definite_complex": "CxCheckPosdef_head",
+        "is_positive_semidefinite": "CheckPosSemiDef_head", "is_positive_semidefinite_complex":
+        "CxCheckPosSemiDef_head", "from_eigenvalues": "CreateMatrixFromEVs_head", "kron": "KroneckerProd_H",
         "kron_complex": "CxKroneckerProd_H", "toeplitz": "SpecialMatrix_head", "toeplitz_complex":
         "CxSpecialMatrix_head",
     },
