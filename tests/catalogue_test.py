@@ -18,10 +18,16 @@ SHAPES = """#ifndef GUARD
      Indented. */
 #include "qx/types.h"
 QX_BEGIN_DECLS
+/* Which ends
+   belong to it. */
+enum Ends { Neither, Lower = 4, /* that one,
+                                   the first */
+            Upper /* the other */ };
 /** A pair. */
 typedef struct Interval {
     double lower, upper;
-    int32_t closure;
+    int32_t closure; /* of Ends,
+                        or 0 */
     DBL1D edges;
     int32_t spare[2];
 } Interval;
@@ -97,6 +103,12 @@ class Reading(unittest.TestCase):
                           for f in result["records"]["Interval"]["fields"]][2:4],
                          [("I32", None, None), (None, "DBL", 1)])
         self.assertTrue(result["records"]["WorkspaceStatus"]["packed"])
+        self.assertEqual(result["records"]["Interval"]["documentation"], "A pair.")
+        self.assertEqual([f.get("documentation") for f in result["records"]["Interval"]["fields"]],
+                         [None, None, "of Ends, or 0", None, None])
+        self.assertEqual(result["enumerations"], {"Ends": {
+            "documentation": "Which ends\nbelong to it.",
+            "values": [[0, ""], [4, "that one, the first"], [5, "the other"]]}})
         self.assertEqual(result["families"], [{
             "name": "shapes", "header": "qx/shapes.h",
             "introduction": "Shapes of all kinds: QX_API in a comment is none.\nIndented."}])

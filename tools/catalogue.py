@@ -70,12 +70,24 @@ class Token:
 
 
 class Statement:
-    """The tokens of one declaration up to its semicolon, and the comment right before it."""
+    """The tokens of one declaration up to its semicolon, the comment right before it, and those inside,
+    each behind a number of tokens."""
 
-    def __init__(self, tokens, comment):
-        self.tokens, self.comment = tokens, comment
+    def __init__(self, tokens, comment, inside):
+        self.tokens, self.comment, self.inside = tokens, comment, inside
         self.words = [token.text for token in tokens]
         self.line = tokens[0].line
+
+    def remarks(self):
+        """What comments behind a field or a value say of it, in its line: by its last word. The mark
+        behind it may come before or after the comment."""
+        found = {}
+        for count, comment in self.inside:
+            before = [token for token in self.tokens[:count] if token.line == comment.line]
+            words = [token.text for token in before if re.match(r"[A-Za-z_]", token.text)]
+            if words:
+                found[words[0 if self.words[0] == "enum" else -1]] = " ".join(documentation_of(comment).split())
+        return found
 
 
 def tokens_of(text):
@@ -88,10 +100,12 @@ def tokens_of(text):
 
 
 def statements_of(path, text):
-    tokens, comment, depth = [], None, 0
+    tokens, comment, inside, depth = [], None, [], 0
     for token in tokens_of(text):
         if token.text.startswith(("/*", "//")):
-            if not tokens:
+            if tokens:
+                inside.append((len(tokens), token))
+            else:
                 comment = token
             continue
         if not tokens and token.text in ("QX_BEGIN_DECLS", "QX_END_DECLS"):
@@ -100,8 +114,8 @@ def statements_of(path, text):
         depth += (token.text in "({[") - (token.text in ")}]")
         if token.text == ";" and depth == 0:
             if tokens:
-                yield Statement(tokens, comment)
-            tokens, comment = [], None
+                yield Statement(tokens, comment, inside)
+            tokens, comment, inside = [], None, []
         else:
             tokens.append(token)
     if tokens:
@@ -146,6 +160,7 @@ class Types:
         self.handles = {}  # name -> (dimensions, element)
         self.opaque = set()  # pointers, or structs behind pointers, that the caller only keeps
         self.procedures = set()
+        self.enumerations = {}  # name -> {"documentation": text, "values": [[number, text]...]}
 
     def read(self, path, statement):
         words = statement.words
@@ -160,6 +175,15 @@ class Types:
             self.procedures.add(match.group(1))
         elif words[1:3] == ["void", "*"] or (words[1] == "struct" and len(words) == 4):
             self.opaque.add(words[3])
+
+    def read_enumeration(self, statement):
+        words, remarks, values = statement.words, statement.remarks(), []
+        for part in split(words[words.index("{") + 1:-1]):
+            if part:
+                number = int(part[2], 0) if part[1:2] == ["="] else values[-1][0] + 1 if values else 0
+                values.append([number, remarks.get(part[0], "")])
+        self.enumerations[words[1]] = {
+            "documentation": documentation_of(statement.comment) if statement.comment else "", "values": values}
 
     def _handle(self, path, line, words):
         dimensions = HANDLE_DIMENSIONS[words[1]]
@@ -183,7 +207,13 @@ class Types:
         for declaration in split(plain[opening + 1:closing], ";"):
             if declaration:
                 fields += self._fields(path, statement.line, declaration)
+        remarks = statement.remarks()
+        for field in fields:
+            if field["name"] in remarks:
+                field["documentation"] = remarks[field["name"]]
         self.records[names[0]] = {"packed": "packed" in words, "fields": fields}
+        if statement.comment:
+            self.records[names[0]]["documentation"] = documentation_of(statement.comment)
 
     def _fields(self, path, line, declaration):
         declaration = [word for word in declaration if word not in ("const", "struct")]
@@ -516,6 +546,8 @@ def read_headers(include):
         for statement in statements:
             if statement.words[0] == "typedef":
                 types.read(path, statement)
+            elif statement.words[0] == "enum" and path.name != "types.h":
+                types.read_enumeration(statement)
     for path, statements in parsed[1:]:
         first = next((t for t in tokens_of(path.read_text("utf-8")) if t.text.startswith("/*")), None)
         introductions.append({"name": path.stem, "header": f"qx/{path.name}",
@@ -541,7 +573,7 @@ def read_headers(include):
         except ValueError as error:
             raise HeaderError(folder.parent / export["header"], export["line"],
                               f"{export['name']} {error}") from error
-    return {"codes": codes, "records": types.records, "families": introductions,
+    return {"codes": codes, "records": types.records, "enumerations": types.enumerations, "families": introductions,
             "exports": exports}
 
 

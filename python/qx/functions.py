@@ -9,6 +9,8 @@ does not need.
 import ctypes
 import keyword
 import linecache
+import re
+import textwrap
 
 import numpy as np
 
@@ -93,6 +95,7 @@ def returned(entry):
 
 
 def documentation(entry):
+    """What is said of an export itself, or of those whose text it takes over."""
     entries = library().entries
     parts = [entry["documentation"]]
     parts += [f"{name}: {entries[name]['documentation']}" for name in entry["inherited"]]
@@ -100,6 +103,40 @@ def documentation(entry):
     if names:
         parts.append(f"Gives {', '.join(names)}.")
     return "\n\n".join(parts)
+
+
+def surroundings(entry):
+    """What belongs to several exports: the records and enumerations that this one takes, its family's text."""
+    catalogue = library().catalogue
+    names = dict.fromkeys(a["element"] for a in entry["arguments"]
+                          if a.get("element") in catalogue["records"] and a["element"] not in COMPLEX)
+    parts = [_record_text(name, library().records[name]) for name in names]
+    text = "\n".join([documentation(entry), *parts])
+    parts += [_enumeration_text(name, one) for name, one in catalogue["enumerations"].items()
+              if re.search(rf"\b{name}\b", text)]
+    introduction = next(f["introduction"] for f in catalogue["families"] if f["name"] == entry["family"])
+    return "\n\n".join([*parts, f"All of {entry['header']}\n{introduction}"] if introduction else parts)
+
+
+def _filled(text, first):
+    return textwrap.fill(text, 96, initial_indent=first, subsequent_indent=" " * (len(first) + 2))
+
+
+def _record_text(name, record):
+    lines = [_filled(f"{name}, a dictionary. {record.get('documentation', '')}".rstrip(), "")]
+    for field in record["fields"]:
+        if field["type"].endswith("*"):
+            continue  # set by the export at every call
+        kind = f"array of {field['array']}, {field['dimensions']}D" if "array" in field else field["type"]
+        count = f" [{field['count']}]" if "count" in field else ""
+        said = f": {field['documentation']}" if field.get("documentation") else ""
+        lines.append(_filled(f"{field['name']} ({kind}{count}){said}", "    "))
+    return "\n".join(lines)
+
+
+def _enumeration_text(name, one):
+    lines = [_filled(f"{name}. {one['documentation']}".rstrip(), "")]
+    return "\n".join(lines + [_filled(f"{number} {text}", "    ") for number, text in one["values"]])
 
 
 class Writer:
@@ -280,7 +317,8 @@ class Writer:
         linecache.cache[place] = (len(text), None, text.splitlines(True), place)
         exec(compile(text, place, "exec"), self.names)
         function = self.names[self.name]
-        function.__module__, function.__doc__ = "qx", documentation(self.entry)
+        text = "\n\n".join(filter(None, [documentation(self.entry), surroundings(self.entry)]))
+        function.__module__, function.__doc__ = "qx", text
         return function
 
 

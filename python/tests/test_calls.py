@@ -453,11 +453,25 @@ class Functions(unittest.TestCase):
             self.assertEqual([part.rstrip("_") for part in names], expected, name)
             self.assertEqual([part.arg for part in stub[name].args.args], names, name)
             self.assertEqual(ast.get_docstring(stub[name], clean=False).count("\n"),
-                             function.__doc__.count("\n"), name)
+                             functions.documentation(entry).count("\n"), name)
             self.assertIs(pickle.loads(pickle.dumps(function)), function)
         self.assertLessEqual({"Mean_head", "call", "list"}, set(dir(qx)))
         own = {path.stem for path in (PYTHON / "qx").glob("*.py")} | set(qx.__all__)
         self.assertEqual(own & set(qx.names()), set(), "names that hide an export")
+
+    def test_help_has_what_exports_share(self):
+        texts = {family["name"]: family["introduction"] for family in library().catalogue["families"]}
+        for name, entry in library().entries.items():
+            text = getattr(qx, name).__doc__
+            self.assertIn(texts[entry["family"]], text, name)
+            for argument in entry["arguments"]:
+                for field in library().records.get(argument.get("element"), {"fields": ()})["fields"]:
+                    if argument["element"] not in ("CDB", "CSG") and not field["type"].endswith("*"):
+                        self.assertIn(f"\n    {field['name']} (", text, name)
+        self.assertIn("width (int32_t): samples of a window, from 3\n", qx.PeakD.__doc__)
+        self.assertNotIn("fitMatrix", qx.PeakD.__doc__, "no field for callers")
+        self.assertRegex(qx.PeakD.__doc__, r"QXPeakFlags\. The bits.*\n    1 starts .*\n    4 scans the last window")
+        self.assertRegex(qx.StateLevels.__doc__, r"QXLevelMethod\. How .*\n(    .*\n)+    2 the histogram where")
 
     def test_a_star_that_begins_a_line_is_kept(self):
         self.assertIn("The code is in\n*err;", qx.IIR_Filter2.__doc__)

@@ -30,19 +30,13 @@ def list_exports(options):
 
 def show_export(options):
     from ..calls import entry as entry_of
-    from ..functions import signature_text
+    from ..functions import documentation, signature_text, surroundings
     from ..library import library
     entry = entry_of(options.name)
-    entries, families = library().entries, library().catalogue["families"]
     print(textwrap.fill(entry["declaration"], 96, subsequent_indent="    "))
     print(f"    C header {entry['header']}")
     print(f"    Python   {signature_text(entry)}\n")
-    print(entry["documentation"])
-    for name in entry["inherited"]:
-        print(f"\n{name}: {entries[name]['documentation']}")
-    introduction = next(f["introduction"] for f in families if f["name"] == entry["family"])
-    if introduction:
-        print(f"\nAll of {entry['header']}\n{introduction}")
+    print("\n\n".join(filter(None, [documentation(entry), surroundings(entry)])))
     if entry["codes"]:
         print("\nMessages")
         for name in entry["codes"]:
