@@ -79,14 +79,14 @@ class Statement:
         self.line = tokens[0].line
 
     def remarks(self):
-        """What comments behind a field or a value say of it, in its line: by its last word. The mark
-        behind it may come before or after the comment."""
-        found = {}
+        """What comments behind a field or a value of an enumeration, in its line, say of it, by names."""
+        is_enumeration, found = self.words[0] == "enum", {}
         for count, comment in self.inside:
-            before = [token for token in self.tokens[:count] if token.line == comment.line]
-            words = [token.text for token in before if re.match(r"[A-Za-z_]", token.text)]
-            if words:
-                found[words[0 if self.words[0] == "enum" else -1]] = " ".join(documentation_of(comment).split())
+            names = [token.text for i, token in enumerate(self.tokens[:count])
+                     if token.line == comment.line and re.match(r"[A-Za-z_]", token.text)
+                     and (not is_enumeration or self.words[i - 1] in ("{", ","))]
+            if names:
+                found[names[-1]] = " ".join(documentation_of(comment).split())
         return found
 
 
