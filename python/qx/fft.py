@@ -767,7 +767,7 @@ def czt(x: ArrayLike, m: int | None = None, w: complex | None = None, a: complex
     >>> qx.fft.czt([1.0, 0.0, -1.0, 0.0]).real.round(12)
     array([0., 2., 0., 2.])
     """
-    m = count_of(x, axis) if m is None else whole_number("fft.czt", "m", m, 1)
+    m = whole_number("fft.czt", "m", count_of(x, axis) if m is None else m, 1)
     w = np.exp(-2j * np.pi / m) if w is None else w
     return either(lambda channel: core.czt(channel, a, w, m, 1),
                   lambda channel: core.czt_complex(channel, a, w, m, 1), x, axis)

@@ -1,0 +1,281 @@
+"""SciPy's own tests, as installed with it, on the functions of the topics whose meaning agrees.
+
+In the namespaces of SciPy's test modules the names of its functions are replaced by adapters, which only take
+the arguments that both have: a test that needs another one is skipped there. What is left out beside, and why,
+is in EXCLUDED.
+"""
+
+import contextlib
+import inspect
+import io
+import sys
+import types
+import unittest
+import warnings
+from pathlib import Path
+
+import numpy as np
+import pytest
+import scipy
+import scipy.signal
+
+PYTHON = Path(__file__).resolve().parent.parent
+sys.path.insert(0, str(PYTHON))
+from qx import fft, filters, linalg, special, spectra  # noqa: E402
+
+
+class Adapter:
+    """A function of a topic under SciPy's name: what it does not take skips the test."""
+
+    def __init__(self, function, neutral=()):
+        self.function, self.neutral, self.calls = function, dict(neutral), 0
+        self.name = self.__name__ = function.__name__
+
+    def __call__(self, *given, **named):
+        for name, value in self.neutral.items():  # arguments that change nothing, or have this value only
+            other = named.pop(name, None)
+            if other is not None and not (np.isscalar(other) and other == value):
+                pytest.skip(f"{name}: another value than {value!r}")
+        for value in given:
+            if isinstance(value, (list, tuple)):
+                continue
+            if np.asarray(value).dtype.kind not in "biufcUO" or getattr(value, "dtype", None) in (
+                    np.longdouble, np.clongdouble, object):
+                pytest.skip("a type of numbers that the core has not")
+        try:
+            self.function.__signature__.bind(*given, **named)
+        except TypeError as error:
+            pytest.skip(str(error))
+        self.calls += 1
+        return self.function(*given, **named)
+
+
+def adapter(**neutral):
+    def adapted(function):
+        function.__signature__ = inspect.signature(function)
+        return Adapter(function, neutral)
+    return adapted
+
+
+def plain(function, **neutral):
+    """An adapter of a function with SciPy's arguments."""
+    def called(*given, **named):
+        return function(*given, **named)
+    called.__signature__, called.__name__ = inspect.signature(function), function.__name__
+    return Adapter(called, neutral)
+
+
+@adapter()
+def zoom_fft(x, fn, m=None, *, fs=2, endpoint=False, axis=-1):
+    if endpoint or not np.ndim(fn):
+        pytest.skip("the end is excluded, and a band has two ends")
+    return fft.zoom(x, fn, m, fs, axis)
+
+
+@adapter(mode="interp", cval=0.0)
+def savgol_filter(x, window_length, polyorder, deriv=0, delta=1.0, axis=-1):
+    return filters.savgol(x, window_length, polyorder, deriv, delta, axis)
+
+
+@adapter(check_finite=True, overwrite_a=False, overwrite_b=False, lower=False, transposed=False)
+def solve(a, b, assume_a="gen"):
+    if assume_a != "gen":
+        pytest.skip("'positive' reads another triangle, and the others are not there")
+    return linalg.solve(a, b)
+
+
+@adapter(check_finite=True, overwrite_ab=False, overwrite_b=False)
+def solve_banded(l_and_u, ab, b):
+    return linalg.solve_banded(l_and_u, ab, b)
+
+
+@adapter(check_finite=True, overwrite_b=False, unit_diagonal=False)
+def solve_triangular(a, b, trans=0, lower=False):
+    if trans:
+        pytest.skip("no transposed system")
+    return linalg.solve(a, b, "lower" if lower else "upper")
+
+
+@adapter(check_finite=True, overwrite_a=False, overwrite_b=False, lapack_driver="gelsd")
+def lstsq(a, b, cond=None):
+    return tuple(linalg.lstsq(a, b, cond))
+
+
+def density(function):
+    @adapter(return_onesided=True)
+    def called(*given, **named):
+        if named.get("detrend") is False:
+            named["detrend"] = "none"
+        if callable(named.get("detrend")):
+            pytest.skip("detrend is a word")
+        try:
+            return tuple(function(*given, **named))
+        except TypeError as error:
+            pytest.skip(str(error))
+    return called
+
+
+def with_estimate(function):
+    @adapter()
+    def called(a, disp=True):
+        return function(a) if disp else (function(a), 0.0)  # an estimate of the error that no test reads
+    return called
+
+
+@adapter(zi=None)
+def lfilter(b, a, x, axis=-1):
+    return filters.from_ba(b, a)(x, axis)
+
+
+@adapter(zi=None)
+def sosfilt(sos, x, axis=-1):
+    return filters.from_sos(sos)(x, axis)
+
+
+def named(module, *names):
+    return {name: plain(getattr(module, name)) for name in names}
+
+
+class Replaced(types.SimpleNamespace):
+    """A module of which some names are replaced."""
+
+    def __init__(self, module, **replaced):
+        super().__init__(**replaced)
+        self.module = module
+
+    def __getattr__(self, name):
+        return getattr(self.module, name)
+
+
+# The file of tests, what is put into its namespace, what is run of it (all by default), and how many tests
+# that call an adapter pass at least.
+FILES = {
+    "signal/tests/test_czt.py": ({"czt": plain(fft.czt), "zoom_fft": zoom_fft}, (), 145),
+    "signal/tests/test_savitzky_golay.py": ({"savgol_filter": savgol_filter}, ("test_sg_filter",), 2),
+    "fft/tests/test_numpy.py": ({"fft": Replaced(scipy.fft, **{
+        name: plain(getattr(fft, name), workers=None, overwrite_x=False) for name in ("fft", "ifft", "rfft", "irfft")})},
+        ("TestFFT1D",), 13),
+    "linalg/tests/test_basic.py": ({
+        "solve": solve, "solve_banded": solve_banded, "solve_triangular": solve_triangular, "lstsq": lstsq,
+        "inv": plain(linalg.inv, overwrite_a=False, check_finite=True),
+        "det": plain(linalg.det, overwrite_a=False, check_finite=True),
+        "pinv": plain(linalg.pinv, check_finite=True)},
+        ("TestSolve", "TestSolveBanded", "TestSolveTriangular", "TestInv", "TestDet", "TestLstsq", "TestPinv"), 38),
+    "linalg/tests/test_special_matrices.py": (named(linalg, "toeplitz", "companion", "kron"),
+                                              ("TestToeplitz", "TestCompanion", "TestKron"), 5),
+    "linalg/tests/test_matfuncs.py": ({
+        "expm": plain(linalg.expm), "logm": with_estimate(linalg.logm), "sqrtm": with_estimate(linalg.sqrtm)},
+        ("TestLogM", "TestSqrtM", "TestExpM"), 19),
+    "linalg/tests/test_solvers.py": ({"solve_sylvester": plain(linalg.solve_sylvester),
+                                      "solve_continuous_lyapunov": plain(linalg.solve_lyapunov)},
+                                     ("TestSolveLyapunov", "TestSolveSylvester"), 3),
+    "signal/tests/test_spectral.py": ({
+        "welch": density(spectra.welch), "periodogram": density(spectra.periodogram), "csd": density(spectra.csd),
+        "coherence": density(spectra.coherence)}, ("TestPeriodogram", "TestWelch", "TestCSD", "TestCoherence"), 43),
+    "signal/tests/test_signaltools.py": ({
+        "lfilter": lfilter, "sosfilt": sosfilt, "hilbert": plain(spectra.analytic)},
+        ("TestHilbert", "TestLinearFilter", "TestSOSFilt"), 45),
+    "special/tests/test_basic.py": ({"special": Replaced(scipy.special, **named(
+        special, "gamma", "gammaln", "gammainc", "beta", "betainc", "erf", "erfc",
+        "dawsn", "fresnel", "ellipk", "ellipkinc", "ellipe", "ellipeinc", "ellipj", "hyp2f1", "hyp1f1",
+        "hyperu", "jv", "yv", "iv", "kn", "kv", "hankel1", "hankel2", "airy"))},
+        ("TestGamma", "TestErf", "TestEllip", "TestBessel", "TestHyper", "TestAiry", "TestBeta", "TestFresnel"), 40),
+}
+
+# Tests that fail, and the difference that they show. A test that fails for no reason given here is a fault, and
+# so is a reason without a test.
+EXCLUDED = {
+    "errors are of another type or text": (
+        "test_czt.py::test_empty_input", "test_czt.py::test_0_rank_input", "test_nonsense_size",
+        "valid_window_length_3d", "test_nonsquare_a", "TestCompanion::test_bad_shapes", "squareness_and_shape",
+        "test_shorter_window_error", "TestHilbert::test_bad_args"),
+    "warnings are of another type": ("test_ill_condition_warning", "LogM::test_exactly_singular",
+                                     "LogM::test_nearly_singular"),
+    "what is empty is refused": ("test_empty_rhs", "Lstsq::test_zero_size", "test_empty_matrix_input",
+                                 "Periodogram::test_empty_input", "Welch::test_empty_input", "CSD::test_empty_input"),
+    "a number is no array or matrix": ("test_scalar_a_and_1D_b", "test_scalar_0", "test_single_elt", "::test_scalar_a"),
+    "right sides have two dimensions or those of the matrix": ("TestSolve::test_multiple_rhs", "Circulant::test_basic3"),
+    "results are of double precision": ("test_data_size_preservation", "test_real_onesided_even_32",
+                                        "test_real_onesided_odd_32", "ExpM::test_2x2_input"),
+    "shapes are not filled up": ("test_short_nfft", "test_pad_shorter"),
+    "a polynomial of order 0 is refused": ("test_sg_filter_trivial",),
+    "a matrix of one row has no diagonals beside it": ("SolveBanded::test_1x1",),
+    "a normalisation is named": ("TestFFT1D::test_rfft",),
+    "digits of zeros, in the size of the others": ("test_czt_vs_fft", "test_large_prime_lengths",
+                                                   "test_window_external",
+                                                   "SqrtM::test_al_mohy_higham_2012_experiment_1"),
+    "real functions outside their domain: NaN, an error or a complex value": (
+        "TestEllip::test_ellipk", "TestEllip::test_ellipe", "TestErf::test_dawsn_nan_inf",
+        "TestGamma::test_infinity", "TestHyper::test_hyp2f1", "test_kv_largearg", "cephes_vs_amos", "test_ticket_854",
+        "test_gh_7909", "test_iv_series"),
+    "real arguments only": ("test_fresnel_values[(", "test_fresnel_values[6j", "test_fresnel_zeros"),
+    # Known faults of the exports.
+    "NaN at phi 0.9272952180016123 and m 0.68359375000000011, and few digits for tiny phi": (
+        "test_ellipkinc_2", "test_ellipeinc_2", "test_ellipkinc_singular"),
+    "half of the digits of the exponential of a quarter turn": ("LogM::test_opposite_sign_complex_eigenvalues",),
+    "no logarithm of a triangle with near eigenvalues and large elements above": (
+        "LogM::test_al_mohy_higham_2012_experiment_1_logm",),
+    "a real logarithm comes as a complex array": ("test_logm_type_preservation",),
+}
+
+
+class Plugin:
+    """Selects the tests, puts the adapters in place, and keeps what comes of it."""
+
+    def __init__(self, replaced, selected):
+        self.replaced, self.selected, self.found, self.before = replaced, selected, {}, 0
+
+    def adapters(self):
+        for value in self.replaced.values():
+            yield from vars(value).values() if isinstance(value, Replaced) else [value]
+
+    def calls(self):
+        return sum(one.calls for one in self.adapters() if isinstance(one, Adapter))
+
+    def pytest_runtest_setup(self, item):
+        self.before = self.calls()
+
+    def pytest_collection_modifyitems(self, items):
+        items[:] = [item for item in items if not self.selected or any(
+            name in item.nodeid for name in self.selected)]
+        for item in items:
+            vars(item.module).update(self.replaced)
+
+    def pytest_runtest_logreport(self, report):
+        if report.when == "call" or report.outcome != "passed":
+            outcome = "without us" if report.passed and self.calls() == self.before else report.outcome
+            self.found[report.nodeid] = (outcome, str(report.longrepr)[-600:])
+
+
+def run(name):
+    replaced, selected, _ = FILES[name]
+    plugin, shown = Plugin(replaced, selected), io.StringIO()
+    with contextlib.redirect_stdout(shown), warnings.catch_warnings():
+        pytest.main(["-q", "-p", "no:cacheprovider", "-W", "ignore", str(Path(scipy.__file__).parent / name)],
+                    plugins=[plugin])
+    unused = [one for one in plugin.adapters() if isinstance(one, Adapter) and not one.calls]
+    assert not unused, (name, [one.name for one in unused])
+    return plugin.found
+
+
+def reason_of(test):
+    """Why a test is excluded."""
+    return next((reason for reason, names in EXCLUDED.items() if any(name in test for name in names)), None)
+
+
+class ScipysTests(unittest.TestCase):
+    def test_the_functions_that_agree(self):
+        missing = {name for names in EXCLUDED.values() for name in names}
+        for name, (_, _, least) in FILES.items():
+            found = run(name)
+            failed = [test for test, (outcome, _) in found.items() if outcome == "failed"]
+            for test in failed:
+                self.assertIsNotNone(reason_of(test), f"{test}\n{found[test][1]}")
+                missing -= {one for one in missing if one in test}
+            passed = sum(outcome == "passed" for outcome, _ in found.values())
+            self.assertGreaterEqual(passed, least, name)
+        self.assertEqual(missing, set(), "excluded, and do not fail")
+
+
+if __name__ == "__main__":
+    sys.exit(unittest.main())
