@@ -473,7 +473,7 @@ def pinv(a: ArrayLike, rcond: float | None = None) -> NDArray[Any]:
     return _each(of_one, _matrix("linalg.pinv", a))
 
 
-def det(a: ArrayLike) -> complex:
+def det(a: ArrayLike) -> Any:
     """The determinant of a square matrix.
 
     Parameters
@@ -501,7 +501,7 @@ def det(a: ArrayLike) -> complex:
     return _each(lambda a: _served("det", a)(a, 0), _matrix("linalg.det", a, True))
 
 
-def trace(a: ArrayLike) -> complex:
+def trace(a: ArrayLike) -> Any:
     """The sum of the diagonal of a square matrix.
 
     Parameters
