@@ -61,7 +61,7 @@ AFTERWARDS = {
     "c++ -std": "./a.out | grep ErrOrderNotPositive",
     "cmake --install": "[ -f ~/qx-library/include/qx/qx.h ]",
     "cc first.c": "(cd / && \"$OLDPWD/first\" | grep '^2.33333 (')",
-    "cmake --build build/release --target reference": "[ -s build/release/reference/index.html ]",
+    "tools/site": "[ -s build/site/index.html ]",
     "cp build/win32": "tools/wine-run first.exe | grep '^2.33333 ('",
 }
 

@@ -122,11 +122,10 @@ class Written(Case):
         _, files = self.same(page, SEEDS[:4])
         self.assertIn("page.md", files)
 
-    @unittest.skipUnless("QX_TEST_ALL" in os.environ, "a quarter of a minute for each: ./test --all")
-    def test_the_reference(self):
+    def test_the_pages_of_the_documentation(self):
         _, files = self.same(lambda seed, folder: output(
-            seed, PYTHON, SOURCE / "tools/reference.py", "--library", BUILD, "--output", folder), SEEDS[:2])
-        self.assertIn("index.html", files)
+            seed, PYTHON, SOURCE / "docs/site/pages.py", folder), SEEDS[:2])
+        self.assertIn("exports/index.rst", files)
 
 
 if __name__ == "__main__":

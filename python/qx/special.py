@@ -661,7 +661,7 @@ def jv(v: ArrayLike, z: ArrayLike, scaled: bool = False) -> Any:
     z : float, complex or array_like
         The argument.
     scaled : bool
-        Multiply by exp(-|Im z|), so that nothing overflows.
+        Multiply by :math:`e^{-|\operatorname{Im} z|}`, so that nothing overflows.
 
     Returns
     -------
@@ -695,7 +695,7 @@ def yv(v: ArrayLike, z: ArrayLike, scaled: bool = False) -> Any:
     z : float, complex or array_like
         The argument.
     scaled : bool
-        Multiply by exp(-|Im z|), so that nothing overflows.
+        Multiply by :math:`e^{-|\operatorname{Im} z|}`, so that nothing overflows.
 
     Returns
     -------
@@ -729,7 +729,7 @@ def iv(v: ArrayLike, z: ArrayLike, scaled: bool = False) -> Any:
     z : float, complex or array_like
         The argument.
     scaled : bool
-        Multiply by exp(-|Re z|), so that nothing overflows.
+        Multiply by :math:`e^{-|\operatorname{Re} z|}`, so that nothing overflows.
 
     Returns
     -------
@@ -927,7 +927,8 @@ def airy(z: ArrayLike, scaled: bool = False) -> Any:
     z : float, complex or array_like
         The argument.
     scaled : bool
-        Multiply Ai and Ai' by exp(zeta), Bi and Bi' by exp(-|Re zeta|), with zeta = 2/3 z^(3/2).
+        Multiply Ai and Ai' by :math:`e^\zeta`, Bi and Bi' by :math:`e^{-|\operatorname{Re} \zeta|}`, with
+        :math:`\zeta = \frac23 z^{3/2}`.
 
     Returns
     -------

@@ -1,0 +1,37 @@
+"""
+Solve a system of equations
+===========================
+
+A hundred equations with as many unknowns, what the condition number says of the result, and what happens
+when a matrix is singular.
+"""
+
+import numpy as np
+import qx
+
+random = np.random.default_rng(7)
+a, x = random.normal(size=(100, 100)), random.normal(size=100)
+b = a @ x
+
+found = qx.linalg.solve(a, b)
+print(f"largest error {np.abs(found - x).max():.1e}")
+
+# %%
+# The condition number is the factor by which relative errors of the data may grow.
+
+print(f"condition number {qx.linalg.cond(a):.0f}")
+
+# %%
+# A singular matrix raises NumPy's own exception, with the argument and the rule in the message.
+
+try:
+    qx.linalg.solve([[1, 2], [2, 4]], [1, 2])
+except np.linalg.LinAlgError as error:
+    print(type(error).__name__, "-", error)
+
+# %%
+# Where there are more equations than unknowns, the least squares solution is found.
+
+tall = random.normal(size=(200, 3))
+measured = tall @ [1.0, -2.0, 0.5] + 0.01 * random.normal(size=200)
+qx.linalg.lstsq(tall, measured)

@@ -1,0 +1,45 @@
+"""
+Filter a signal that never ends
+===============================
+
+Samples come in blocks of any size. A stream keeps the memory of the filter from block to block, and the
+results are those of the whole signal, to the bit.
+"""
+
+import numpy as np
+import qx
+
+random = np.random.default_rng(7)
+x = random.normal(size=4000)
+blocks = np.split(x, [10, 1000, 1001, 3500])
+print("blocks of", [len(block) for block in blocks])
+
+bandlimit = qx.filters.elliptic(5, 0.1, 60, 100, fs=1000)
+stream = bandlimit.stream()
+y = np.concatenate([stream(block) for block in blocks])
+print("the same bits as the whole:", bool(np.array_equal(y, bandlimit(x))))
+
+# %%
+# Several channels run through one stream.
+
+channels = random.normal(size=(8, 4000))
+stream = bandlimit.stream(channels=8)
+parts = [stream(channels[:, start:start + 256]) for start in range(0, 4000, 256)]
+print("the same bits:", bool(np.array_equal(np.hstack(parts), bandlimit(channels))))
+
+# %%
+# A copy of a stream goes on by itself; ``reset`` begins anew.
+
+other = stream.copy()
+stream.reset()
+first = channels[:, :256]
+print("begun anew:", np.array_equal(stream(first), parts[0]))
+print("gone on:", not np.array_equal(other(first), parts[0]))
+
+# %%
+# Running statistics have the same protocol.
+
+running = qx.stats.Running()
+for block in blocks:
+    latest = running(block)
+latest
