@@ -61,7 +61,8 @@ sphinx_gallery_conf = {
     "remove_config_comments": True,
     "abort_on_example_error": True,
     "plot_gallery": "True",
+    "default_thumb_file": pages.thumbnail(Path(os.environ["QX_SITE_SOURCE"])),
     "image_scrapers": ("matplotlib",),
     "reset_modules": ("matplotlib", pages.plot_style),
-    "capture_repr": ("_repr_html_", "__repr__"),
+    "capture_repr": ("_repr_html_",),
 }

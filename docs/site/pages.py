@@ -129,6 +129,21 @@ def mentions(name):
                       rf"{word}(?= ?[-+*/=,;:.)^\[]| (?:is|are|has|and|by|in|=)\b)")
 
 
+def clipped(sentence, pattern, enough=70):
+    """The sentence, of a long one the clauses around what the pattern finds."""
+    if len(sentence) <= 2 * enough:
+        return sentence
+    clauses = re.split(r"(?<=[,;:]) ", sentence)
+    first = next((i for i, clause in enumerate(clauses) if pattern.search(clause)), None)
+    if first is None:
+        return sentence
+    last = first
+    while last + 1 < len(clauses) and len(" ".join(clauses[first:last + 1])) < enough:
+        last += 1
+    found = " ".join(clauses[first:last + 1])
+    return ("... " if first else "") + (found if last + 1 == len(clauses) else found.rstrip(",;:") + " ...")
+
+
 def texts_of(entry):
     """The texts that describe an export: its own, those it takes over, and that of its header."""
     entries = library().entries
@@ -147,7 +162,7 @@ def meaning(entry, argument):
     for text in texts_of(entry):
         for sentence in sentences(text):
             if pattern.search(sentence):
-                return sentence
+                return clipped(sentence, pattern)
     ruled = [text for texts in reasons(entry).values() for text in texts if pattern.search(text)]
     if ruled:
         return "Refused: " + "; ".join(ruled) + "."
@@ -375,7 +390,25 @@ def plot_style(gallery_conf, file):
                          "axes.grid": True, "grid.color": "0.9", "legend.frameon": False})
 
 
+def thumbnail(folder):
+    """The picture of the examples without plots; its path."""
+    import matplotlib.figure
+    figure = matplotlib.figure.Figure(figsize=(4, 2.8))
+    axes = figure.add_axes([0, 0, 1, 1])
+    axes.text(0.5, 0.5, ">>> qx", size=30, family="monospace", color="0.5", ha="center", va="center")
+    axes.axis("off")
+    figure.savefig(folder / "thumbnail.png", facecolor="white")
+    return str(folder / "thumbnail.png")
+
+
+def show_code(app, what, name, thing, options, lines):
+    """Indented blocks of the text of a module are code."""
+    if what == "module":
+        lines[:] = re.sub(r"(^|\n)\n(?=    \S)", r"\1\n.. code-block:: python\n\n", "\n".join(lines)).split("\n")
+
+
 def setup(app):
+    app.connect("autodoc-process-docstring", show_code)
     app.connect("builder-inited", lambda app: write(app.srcdir))
     return {"parallel_read_safe": True}
 

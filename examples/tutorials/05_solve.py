@@ -6,6 +6,7 @@ A hundred equations with as many unknowns, what the condition number says of the
 when a matrix is singular.
 """
 
+import matplotlib.pyplot as plt
 import numpy as np
 import qx
 
@@ -35,3 +36,15 @@ except np.linalg.LinAlgError as error:
 tall = random.normal(size=(200, 3))
 measured = tall @ [1.0, -2.0, 0.5] + 0.01 * random.normal(size=200)
 qx.linalg.lstsq(tall, measured)
+
+# %%
+# The errors of the solution grow with the condition number. Here for Hilbert's matrices, which are known for it.
+
+orders = np.arange(2, 9)
+matrices = [1 / (np.arange(1, n + 1)[:, None] + np.arange(n)) for n in orders]
+errors = [np.abs(qx.linalg.solve(h, h.sum(1)) - 1).max() for h in matrices]
+figure, axes = plt.subplots(figsize=(8, 3))
+axes.semilogy(orders, [2.2e-16 * qx.linalg.cond(h) for h in matrices], color="0.7", label="condition number, times eps")
+axes.semilogy(orders, errors, "o-", label="error")
+axes.set(xlabel="Order")
+axes.legend()

@@ -6,6 +6,7 @@ Samples come in blocks of any size. A stream keeps the memory of the filter from
 results are those of the whole signal, to the bit.
 """
 
+import matplotlib.pyplot as plt
 import numpy as np
 import qx
 
@@ -18,6 +19,13 @@ bandlimit = qx.filters.elliptic(5, 0.1, 60, 100, fs=1000)
 stream = bandlimit.stream()
 y = np.concatenate([stream(block) for block in blocks])
 print("the same bits as the whole:", bool(np.array_equal(y, bandlimit(x))))
+
+figure, axes = plt.subplots(figsize=(8, 3))
+axes.plot(x, color="0.8")
+axes.plot(y)
+for edge in (10, 1000, 3500):
+    axes.axvline(edge, color="0.4", linestyle=":")
+axes.set(xlabel="Sample", xlim=(0, 4000))
 
 # %%
 # Several channels run through one stream.
