@@ -43,7 +43,8 @@ TEXTS = {
     "matrix_properties": {"isSemiDefinite": "1 if the matrix is positive semidefinite, else 0."},
     "model_fits": {
         "a": "The factor of the model.", "deviations": "The standard deviations of the samples.",
-        "method": "0 for the method of the export without a number in its name; any other goes on from there.", "mse": "The mean squared error.",
+        "method": "0 for the method of the export without a number in its name; any other goes on from there.",
+        "mse": "The mean squared error.",
         "w": "The weights of the samples."},
     "noise": {"cache": "What is kept from call to call; all 0 before the first.", "x": "The numbers."},
     "peaks": {"request": "The block, what to look for, and what is found."},

@@ -291,7 +291,8 @@ def export_text(entry, served, pairs):
 
 
 # Names of families whose words are abbreviations.
-HEADINGS = {"anova": "Analysis of variance", "chirp_z": "Chirp-z transform", "convolution_2d": "Convolution in two dimensions",
+HEADINGS = {"anova": "Analysis of variance", "chirp_z": "Chirp-z transform",
+            "convolution_2d": "Convolution in two dimensions",
             "dct_dst": "Cosine and sine transforms", "dzt": "Narrow band of a long transform", "fft": "Fourier transform",
             "fft2d": "Fourier transform in two dimensions", "fir_design": "FIR filter design",
             "frame": "Workspace and host", "hartley_hilbert": "Hartley and Hilbert transforms",
@@ -326,8 +327,9 @@ def exports_pages():
     by_name = sorted(catalogue["exports"], key=lambda entry: entry["name"].lower())
     pages["exports/all.rst"] = "\n\n".join([
         title("All exports by name", "="), table(["Export", "Effect"], rows_of(by_name), [35, 65])]) + "\n"
-    families = [[f":doc:`{heading(name)} <{name}>`", str(sum(e["family"] == name for e in catalogue["exports"])),
-                 marked(sentences(next(f["introduction"] for f in catalogue["families"] if f["name"] == name))[0])]
+    families = [[f":doc:`{heading(name)} <{name}>`",
+                 str(sum(entry["family"] == name for entry in catalogue["exports"])), marked(sentences(
+                     next(f["introduction"] for f in catalogue["families"] if f["name"] == name))[0])]
                 for name in listed]
     pages["exports/index.rst"] = "\n\n".join([
         title("Reference of the exports", "="),

@@ -33,7 +33,7 @@ t = np.linspace(0, 2, 201)
 x = np.cos(2 * np.pi * t) + 0.3 * t
 integral = qx.Integral_2017(x, 0.01, 3)
 back = qx.Derivative85(integral, [integral[0] - 0.01 * x[0]], [integral[-1] + 0.01 * x[-1]],
-               0.01, 0)
+                       0.01, 0)
 print("largest difference inside", np.abs(back - x)[1:-1].max())
 figure, axes = plt.subplots(figsize=(8, 2.4))
 axes.plot(t, x, label="x", color="#2f6db3")

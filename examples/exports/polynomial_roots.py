@@ -19,7 +19,7 @@ print(np.sort_complex(roots.round(6)))
 
 coefficients = np.polynomial.polynomial.polyfromroots([1, 2, -0.5 + 1j, -0.5 - 1j]).real
 print(qx.PolyRootsNtBst_head(coefficients, [0.8, 2.3], 50, 1e-14,
-              [-0.52 + 0.98j, -0.52 - 0.98j], 50, 1e-14))
+                             [-0.52 + 0.98j, -0.52 - 0.98j], 50, 1e-14))
 
 # %%
 # Multiple roots with their multiplicities

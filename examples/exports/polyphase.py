@@ -18,7 +18,7 @@ once, *_ = qx.ppMultiRateFIRH_DBL(x, [], 3, 3, 2, taps, 1.0, 1, 1, 0, 0)
 state, delay, phase, reset, blocks = [], 0, 0, 1, []
 for block in np.split(x, [1, 10, 500]):
     y, state, delay, phase = qx.ppMultiRateFIRH_DBL(block, state, 3, 3, 2, taps, 1.0,
-                                     reset, 1, delay, phase)
+                                                    reset, 1, delay, phase)
     blocks.append(y)
     reset = 0
 print("rate 3/2:", once.size, "outputs; equal in blocks:", np.array_equal(np.concatenate(blocks), once))

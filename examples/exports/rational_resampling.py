@@ -48,5 +48,5 @@ axes.set(xlabel="Tone at 48 kHz, kHz", ylabel="Level at 44.1 kHz, dB")
 
 stereo = np.stack([x, -x])
 offset, state, count, y = qx.RationalResampleMultiCh_H(stereo, L, M, 1, 0, taps,
-                                  np.zeros((0, 0)), 0)
+                                                       np.zeros((0, 0)), 0)
 print(y.shape, np.abs(y[0] + y[1]).max())
