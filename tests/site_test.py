@@ -96,6 +96,8 @@ class Site(unittest.TestCase):
             anchors = self.pages[SITE / f"topics/{topic}.html"].anchors
             for name in importlib.import_module(f"qx.{topic}").__all__:
                 self.assertIn(f"qx.{topic}.{name}", anchors)
+        start = (SITE / "index.html").read_text("utf-8")
+        self.assertIn(f"{len(exports)} C functions in one module", " ".join(start.split()))
         outputs = [(SITE / f"tutorials/{path.stem}.html").read_text("utf-8")
                    for path in (SOURCE / "examples/tutorials").glob("*.py")]
         self.assertEqual(len(outputs), 10)
