@@ -403,14 +403,16 @@ def thumbnail(folder):
     return str(folder / "thumbnail.png")
 
 
-def show_code(app, what, name, thing, options, lines):
-    """Indented blocks of the text of a module are code."""
+def settle(app, what, name, thing, options, lines):
+    """Indented blocks of the text of a module are code, and a name such as "M. Abramowitz" begins no list."""
+    text = re.sub(r"^( *)([A-Z])\. ", r"\1\\\2. ", "\n".join(lines), flags=re.MULTILINE)
     if what == "module":
-        lines[:] = re.sub(r"(^|\n)\n(?=    \S)", r"\1\n.. code-block:: python\n\n", "\n".join(lines)).split("\n")
+        text = re.sub(r"(^|\n)\n(?=    \S)", r"\1\n.. code-block:: python\n\n", text)
+    lines[:] = text.split("\n")
 
 
 def setup(app):
-    app.connect("autodoc-process-docstring", show_code)
+    app.connect("autodoc-process-docstring", settle)
     app.connect("builder-inited", lambda app: write(app.srcdir))
     return {"parallel_read_safe": True}
 
