@@ -255,7 +255,7 @@ def standing(entry, served, pairs):
             out.append("A twin for hosts that keep the plan in their instance data.")
         elif text == topics_table.HOST:
             out.append("For hosts.")
-        elif text != topics_table.NONE:
+        else:
             out.append(f"In Python: {functions_linked(functions) if functions else escaped(text)}.")
     if newer := [new for elder, new in pairs if elder == name]:
         out.append(f"Its revision: {', '.join(map(link, newer))}.")
