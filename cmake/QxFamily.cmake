@@ -73,6 +73,10 @@ const char *const qx::test::testDataFolder = \"${CMAKE_CURRENT_SOURCE_DIR}/tests
     add_executable(${name} ${ARGN} ${place})
     set_target_properties(${name} PROPERTIES ENABLE_EXPORTS ON)
     target_link_libraries(${name} PRIVATE qxanalysis qxcore qxtestsupport GTest::gtest_main)
+    get_property(precompiled GLOBAL PROPERTY QX_PRECOMPILED)
+    if(precompiled)
+        target_precompile_headers(${name} REUSE_FROM ${precompiled})
+    endif()
     qx_run_as_test(${name})
 endfunction()
 

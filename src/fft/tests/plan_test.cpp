@@ -180,7 +180,7 @@ void StandInTheMiddle() {
 }
 
 // While one thread builds a plan, which may take seconds, others get theirs.
-TEST(Plan, OfAnotherLengthIsBuiltMeanwhile) {
+TEST(Plan, OfAnotherLengthIsBuiltByAThreadMeanwhile) {
     if (!qx::test::HeapProbe::works())
         GTEST_SKIP();
     std::latch stands(1), mayGoOn(1);
