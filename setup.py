@@ -58,6 +58,6 @@ class OfThisPlatform(bdist_wheel):
 (BUILD / "python").mkdir(parents=True, exist_ok=True)
 setup(version=re.search(r"project\(qxanalysis VERSION (\S+)", PROJECT)[1], distclass=HasLibraries,
       package_dir={"": "python"}, packages=["qx", "qx.commands", "qx.topical"],
-      package_data={"qx": ["py.typed"]},
+      package_data={"qx": ["py.typed", "*.css", "*.js"]},
       cmdclass={"build_py": WithLibraries, "bdist_wheel": OfThisPlatform},
       options={"egg_info": {"egg_base": "build/python"}, "build": {"build_base": "build/python"}})

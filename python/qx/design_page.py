@@ -1,42 +1,26 @@
-"""The page that shows what a filter does: magnitude, phase and group delay."""
+"""The page that shows what a filter does, where its poles and zeros are, and how a program uses it."""
 
 import html
 import math
 
 import numpy as np
 
-from . import drawing, outputs, pages
+from . import figures, outputs, pages
 from .sections import Row, Section, number, resolved
 
 POINTS = 4000
 FLOOR = -200.0  # dB
+AROUND = 4.0  # times the highest edge, up to which the axes go at first
+SHOWN = 40  # coefficients in the lines of C; more are left out
 
 
-def write(filter_, title, rate, path):
+def write(design, title, rate, path):
     """Writes the page and gives the lines for the terminal."""
-    frequencies = np.linspace(0, 0.5, POINTS + 1)
-    section = described(filter_, frequencies, rate)
-    outputs.write_text(path, page(title, section))
-    lines = [title, ""]
-    wide = max(len(row.label) for row in section.rows)
-    lines += [f"  {row.label:<{wide}}  {row.value} {row.unit}".rstrip() for row in section.rows]
-    return lines
-
-
-def page(title, section):
-    rows = "".join(f"<tr><td>{html.escape(row.label)}</td><td>{html.escape(row.value)} "
-                   f"{html.escape(row.unit)}</td><td>{html.escape(row.export)}</td></tr>"
-                   for row in section.rows)
-    figures = "".join(f"<figure>{figure}</figure>" for figure in section.figures)
-    return (f'<!DOCTYPE html>\n<html lang="en"><head><meta charset="utf-8">'
-            f'<meta name="viewport" content="width=device-width">{outputs.generator("design")}'
-            f"<title>{html.escape(title)}</title>"
-            f"<style>{pages.COMMON_STYLE} td {{ padding: .1em 1.2em .1em 0; }}</style></head><body>"
-            f"<h1>{html.escape(title)}</h1>{figures}<table>{rows}</table></body></html>\n")
-
-
-def decibels(gain):
-    return 20 * np.log10(np.maximum(np.abs(gain), 10 ** (FLOOR / 20)))
+    sections = described(design, rate)
+    outputs.write_text(path, pages.page("design", title, "", sections))
+    rows = sections[0].rows
+    wide = max(len(row.label) for row in rows)
+    return [title, "", *(f"  {row.label:<{wide}}  {row.value} {row.unit}".rstrip() for row in rows)]
 
 
 def half_power(frequencies, gain):
@@ -47,52 +31,183 @@ def half_power(frequencies, gain):
     return frequencies[at] + share * (frequencies[at + 1] - frequencies[at])
 
 
-def described(filter_, frequencies, rate):
-    gain, delay = filter_.response(frequencies), filter_.group_delay(frequencies)
-    unit = "Hz" if rate != 1 else "cycles per sample"
-    coefficients = sum(len(b) + len(a) - 1 for b, a in filter_.sections)
-    kind = (f"{coefficients} taps" if filter_.is_fir() else
-            f"{len(filter_.sections)} sections, {coefficients} coefficients")
-    crossings = resolved(rate * half_power(frequencies, gain), rate * frequencies[1])
-    passed = np.abs(gain) > 0.5 ** 0.5 * np.abs(gain).max()
-    delays = delay[passed & np.isfinite(delay)]
-    rows = [Row("Filter", kind + (", " + filter_.note if filter_.note else ""), "",
-                filter_.export),
-            Row("Stable", "yes" if filter_.is_stable() else "NO", "", "roots"),
-            Row("Half power at", ", ".join(crossings) or "no frequency", unit, ""),
-            Row("Least gain", number(decibels(gain).min(), 4), "dB", ""),
-            Row("Greatest gain", number(decibels(gain).max(), 4), "dB", "")]
+def frequencies_for(edges, rate):
+    """Even ones up to half the rate, and as many about the edges."""
+    low, high = shown_range(edges, rate)
+    return np.unique(np.concatenate([np.linspace(0, rate / 2, POINTS + 1), np.linspace(low, high, POINTS + 1),
+                                     np.geomspace(1e-4 * edges[0], rate / 2, POINTS // 4), edges]))
+
+
+def shown_range(edges, rate):
+    """What the axes of frequency show at first: the edges, and what is about them."""
+    if len(edges) == 1:
+        return 0.0, min(rate / 2, AROUND * edges[0])
+    room = max(AROUND * (edges[-1] - edges[0]), 0.05 * edges[-1])
+    return max(0.0, edges[0] - room), min(rate / 2, edges[-1] + room)
+
+
+def unwrapped(gain):
+    """The phase in degrees, without jumps of a turn, and of half a turn where the gain passes 0."""
+    phase = np.angle(gain)
+    phase[np.abs(gain) < 1e-12] = math.nan
+    known = np.flatnonzero(np.isfinite(phase))
+    phase[known] = np.unwrap(2 * phase[known]) / 2
+    return np.degrees(phase)
+
+
+def described(design, rate):
+    """The sections: what the filter is, its responses, its poles and zeros, its coefficients, its use."""
+    filter_, edges = design.filter, design.edges
+    frequencies = frequencies_for(edges, rate)
+    response = filter_.response(frequencies, rate)
+    unit, delay_unit, factor = ("Hz", "ms", 1000 / rate) if rate != 1 else ("cycles per sample", "samples", 1.0)
+    gain, delay = response.values, factor * response.delay
+    decibels = np.maximum(response.decibels, FLOOR)
+    size = (f"{len(filter_.sos)} sections of second order" if filter_.is_iir else f"{len(filter_.taps)} taps")
+    crossings = resolved(half_power(frequencies, gain), rate / 2 / POINTS)
+    delays = delay[(np.abs(gain) > 0.5 ** 0.5 * np.abs(gain).max()) & np.isfinite(delay)]
+    rows = [Row("Filter", size + (", " + design.note if design.note else ""), "", design.python),
+            Row("Stable", "yes" if filter_.is_stable else "NO", "", "Filter.poles"),
+            Row("Half power at", ", ".join(crossings) or "no frequency", unit, "Filter.response"),
+            Row("Least gain", number(round(float(decibels.min()), 6), 4), "dB", "Filter.response"),
+            Row("Greatest gain", number(round(float(decibels.max()), 6), 4), "dB", "Filter.response")]
     if len(delays):
-        rows.append(Row("Group delay of what passes",
-                        f"{number(delays.min(), 4)} to {number(delays.max(), 4)}",
-                        "samples", ""))
-    return Section("Filter", "", rows, figures(frequencies, gain, delay, rate, unit))
+        low, high = number(delays.min(), 4), number(delays.max(), 4)
+        rows.append(Row("Group delay of what passes", low if low == high else f"{low} to {high}", delay_unit,
+                        "Filter.response"))
+    return [Section("Filter", f"Edges at {', '.join(f'{edge:g}' for edge in edges)} {unit}, at a rate of {rate:g}.",
+                    rows, _over_frequency(design, frequencies, rate, unit, [
+                        ("Magnitude", "Gain (dB)", decibels, _gain_range(decibels)),
+                        ("Phase, without jumps", "Phase (degrees)", unwrapped(gain), None),
+                        ("Group delay", f"Delay ({delay_unit})", delay, _delay_range(delay, gain))])),
+            Section("Responses over time", "To a single 1, and to ones without end.", [],
+                    _over_time(filter_, rate, factor, delay_unit)),
+            Section("Poles and zeros", "In the z plane, × poles and ○ zeros; the filter is stable with all poles "
+                    "inside the circle.", [], [plane(filter_.poles, filter_.zeros)]),
+            Section("Coefficients", "Sections of second order, one to a row, as SciPy has them in sos."
+                    if filter_.is_iir else "The taps, which are also the impulse response.", [],
+                    [coefficients(filter_)]),
+            Section("In a program", "The same filter in Python, C and C++.", [], programs(design))]
 
 
-def figures(frequencies, gain, delay, rate, unit):
-    plt = drawing.pyplot()
-    x = rate * frequencies
-    phase = np.where(np.abs(gain) < 1e-12, math.nan, np.angle(gain))
-    jumps = np.flatnonzero(np.abs(np.diff(phase)) > 0.9 * math.pi) + 1
-    phase = np.insert(phase, jumps, math.nan)  # no line is drawn across them
-    curves = [("Magnitude", "Gain (dB)", x, decibels(gain)),
-              ("Phase", "Phase (degrees)", np.insert(x, jumps, x[jumps]), np.degrees(phase)),
-              ("Group delay", "Delay (samples)" if rate == 1 else "Delay (ms)", x,
-               delay * (1 if rate == 1 else 1000 / rate))]
-    drawn = []
-    for name, label, at, values in curves:
-        figure, axes = plt.subplots(figsize=(10, 2.8))
-        axes.plot(at, values, color=drawing.BLUE, linewidth=1.2)
-        axes.set(title=name, xlabel=f"Frequency ({unit})", ylabel=label)
-        axes.margins(x=0.005)
-        if name == "Magnitude":
-            top = values.max()
-            axes.set_ylim(max(values.min(), top - 140) - 3, top + 5)
-        if name == "Group delay":
-            # Where nothing passes the delay may be anything.
-            passed = values[(np.abs(gain) > 1e-3 * np.abs(gain).max()) & np.isfinite(values)]
-            low, high = passed.min(), passed.max()
-            room = 0.1 * (high - low) + 1e-3 * abs(high)
-            axes.set_ylim(low - room, high + room)
-        drawn.append(drawing.svg(plt, figure))
-    return drawn
+def _gain_range(decibels):
+    top = float(decibels.max())
+    return max(float(decibels.min()), top - 140) - 3, top + 5
+
+
+def _delay_range(delay, gain):
+    """Where nothing passes the delay may be anything."""
+    passed = delay[(np.abs(gain) > 1e-3 * np.abs(gain).max()) & np.isfinite(delay)]
+    room = 0.1 * np.ptp(passed) + 1e-3 * np.abs(passed).max() + 1e-12
+    return float(passed.min() - room), float(passed.max() + room)
+
+
+def _over_frequency(design, frequencies, rate, unit, curves):
+    marks = [(float(edge), f"edge {edge:g}") for edge in design.edges]
+    return [figures.Plot(title, f"Frequency ({unit})", label, [figures.Curve(title.split(",")[0].lower(), values)],
+                         x=frequencies, verticals=marks, y_range=y_range, link="frequency", may_be_log=True,
+                         x_range=shown_range(design.edges, rate)) for title, label, values, y_range in curves]
+
+
+def _over_time(filter_, rate, factor, unit):
+    settled = min(20_000, filter_._ringing() if filter_.is_iir else len(filter_.taps)) + 8
+    impulse = filter_(np.r_[1.0, np.zeros(settled - 1)])
+    step = filter_(np.ones(settled))
+    return [figures.Plot(title, f"Time ({unit})", "Response", [figures.Curve("response", values)], step=factor,
+                         link="time") for title, values in (("Impulse response", impulse), ("Step response", step))]
+
+
+def plane(poles, zeros):
+    """Poles and zeros with the unit circle, as a drawing."""
+    reach = max(1.0, float(np.abs(np.r_[poles, zeros, 1.0])[np.abs(np.r_[poles, zeros, 1.0]) < 3].max(initial=1))) * 1.15
+
+    def at(point):
+        return 100 + 95 * point.real / reach, 100 - 95 * point.imag / reach
+
+    radius = 95 / reach
+    parts = ['<svg class="plane" viewBox="0 0 200 200" role="img" aria-label="poles and zeros">',
+             f'<circle cx="100" cy="100" r="{radius:.2f}"/><path d="M2 100H198M100 2V198"/>',
+             f'<text x="{100 + radius + 1:.1f}" y="98">1</text><text x="103" y="{100 - radius - 2:.1f}">j</text>']
+    for point in zeros[np.abs(zeros) < 3]:
+        x, y = at(point)
+        parts.append(f'<circle class="zero" cx="{x:.2f}" cy="{y:.2f}" r="2.6"/>')
+    for point in poles:
+        x, y = at(point)
+        parts.append(f'<path class="pole" d="M{x - 2.6:.2f} {y - 2.6:.2f}l5.2 5.2m0-5.2l-5.2 5.2"/>')
+    far = int(np.count_nonzero(np.abs(zeros) >= 3))
+    note = f"<figcaption>{far} more zero{'s' * (far > 1)} outside the drawing.</figcaption>" if far else ""
+    return "<figure>" + "".join(parts) + f"</svg>{note}</figure>"
+
+
+def coefficients(filter_):
+    if filter_.is_iir:
+        names, rows = ("b0", "b1", "b2", "a0", "a1", "a2"), filter_.sos
+    else:
+        names, rows = ("h",), filter_.taps[:, None]
+    head = "".join(f"<th>{name}</th>" for name in ("", *names))
+    body = "".join(f"<tr><th>{i}</th>" + "".join(f'<td class="value">{value!r}</td>' for value in row) + "</tr>\n"
+                   for i, row in enumerate(rows.tolist()))
+    text = f"sos = {filter_.sos.tolist()!r}" if filter_.is_iir else f"h = {filter_.taps.tolist()!r}"
+    return (f'<details open><summary>As a table</summary><div class="wide"><table><tr>{head}</tr>{body}</table></div>'
+            f"</details><details><summary>As text</summary><pre>{html.escape(text)}</pre></details>")
+
+
+def arrays_of(filter_):
+    """a and b as the exports take them."""
+    if not filter_.is_iir:
+        return [], filter_.taps.tolist()
+    sos = filter_.sos
+    return sos[:, 4:].ravel().tolist(), sos[:, :3].ravel().tolist()
+
+
+def programs(design):
+    """Lines of Python, C and C++ that filter x."""
+    a, b = arrays_of(design.filter)
+    python = f"import qx\n\nf = {design.python}\ny = f(x)  # f.zero_phase(x) has no delay"
+    texts = [("Python", python)]
+    if len(a) + len(b) <= SHOWN:
+        texts += [("C", c_program(a, b)), ("C++", cpp_program(a, b))]
+    else:
+        texts.append(("C and C++", "The coefficients are too many to be shown here: design.json has them, for\n"
+                      "IIR_Filter2 (sections) or IIR_Filter (taps) of qx/filtering.h."))
+    return ["".join(f"<h3>{name}</h3><pre>{html.escape(text)}</pre>" for name, text in texts)]
+
+
+def c_program(a, b):
+    lines = ['#include "qx/filtering.h"', '#include "qx/host.h"', "", "/* Filters n samples in place. */",
+             "ErrorCode apply(double *samples, int32_t n) {"]
+    lines += [f"    const double {name}_[] = {{{', '.join(map(repr, values))}}};"
+              for name, values in (("a", a), ("b", b)) if values]
+    lines.append("    DBL1D x = QXHostCopy1D(QXTypeDBL, n, samples);")
+    lines += [f"    DBL1D {name} = " + (f"QXHostCopy1D(QXTypeDBL, {len(values)}, {name}_);" if values else
+                                        "QXHostNew1D(QXTypeDBL, 0);") for name, values in (("a", a), ("b", b))]
+    if a:
+        lines += ["    DBL1D state = QXHostNew1D(QXTypeDBL, 0);", "    const int32_t form = 0;",
+                  "    const uint8_t keep = 0;", "    ErrorCode err;",
+                  "    IIR_Filter2(x, &form, a, b, state, &keep, &err);"]
+        freed = "x, a, b, state"
+    else:
+        lines += ["    DBL1D xState = QXHostNew1D(QXTypeDBL, 0);", "    DBL1D yState = QXHostNew1D(QXTypeDBL, 0);",
+                  "    const uint8_t keep = 0;", "    ErrorCode err;",
+                  "    IIR_Filter(x, a, b, xState, yState, &keep, &err);"]
+        freed = "x, a, b, xState, yState"
+    lines += ["    for (int32_t i = 0; err >= 0 && i < n; ++i)",
+              "        samples[i] = ((double *)QXHostElements1D(x))[i];"]
+    lines += [f"    QXHostFree({name});" for name in freed.split(", ")]
+    return "\n".join([*lines, "    return err;", "}"])
+
+
+def cpp_program(a, b):
+    def array(name, values):
+        return f"    const qx::host::Array1D<double> {name}{{{', '.join(map(repr, values))}}};"
+
+    lines = ['#include "qx/filtering.h"', '#include "qx/host.hpp"', "",
+             "void apply(const qx::host::Array1D<double> &x) {", array("a", a), array("b", b)]
+    if a:
+        lines += ["    const qx::host::Array1D<double> state;", "    const int32_t form = 0;"]
+        call = "IIR_Filter2(x.handle(), &form, a.handle(), b.handle(), state.handle(), &keep, &err);"
+    else:
+        lines.append("    const qx::host::Array1D<double> xState, yState;")
+        call = "IIR_Filter(x.handle(), a.handle(), b.handle(), xState.handle(), yState.handle(), &keep, &err);"
+    return "\n".join([*lines, "    const uint8_t keep = 0;", "    ErrorCode err;", f"    {call}",
+                      "    qx::host::check(err);", "}"])

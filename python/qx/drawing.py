@@ -1,14 +1,18 @@
-"""Plots as SVG texts for pages. Colours are those of a light page; the style of the pages (pages.py) turns
-them round on a dark one."""
+"""Plots drawn by matplotlib: as SVG texts for pages without dygraphs, and as files of their own. Colours
+are those of a light page; the style of the pages (pages.py) turns them round on a dark one."""
 
 import io
 import math
+import os
 import textwrap
 import warnings
 
 import numpy as np
 
+from . import figures, outputs
+
 BLUE, DARK, GREY, WARM = "#2f6db3", "#1f2d3d", "#8795a6", "#c8553d"
+COLOURS = {figures.BLUE: BLUE, figures.WARM: WARM, figures.GREY: GREY}
 NARROW = 4.6  # inches
 
 
@@ -28,18 +32,18 @@ def pyplot():
     return plt
 
 
-def svg(plt, figure):
-    """The figure for a page: as it is, and redrawn for windows as narrow as a telephone."""
+def svg(plot):
+    """The plot for a page: as it is, and redrawn for windows as narrow as a telephone."""
+    plt = pyplot()
+    figure, axes = plt.subplots(figsize=(10, 3.0))
+    draw(axes, plot)
     drawings = [_drawn(plt, figure, "wide")]
-    width, height = figure.get_size_inches()
-    if width > 6:
-        figure.set_size_inches(NARROW, max(2.6, 0.85 * height))
-        for axes in figure.axes:
-            axes.set_title(textwrap.fill(axes.get_title("left"), 46), loc="left")
-            longest = max((len(label.get_text()) for label in axes.get_xticklabels()), default=0)
-            if longest > 5 and axes.get_xscale() == "linear":
-                axes.locator_params(axis="x", nbins=max(2, 40 // (longest + 2)))
-        drawings.append(_drawn(plt, figure, "narrow"))
+    figure.set_size_inches(NARROW, 2.7)
+    axes.set_title(textwrap.fill(plot.title, 46), loc="left")
+    longest = max((len(label.get_text()) for label in axes.get_xticklabels()), default=0)
+    if longest > 5:
+        axes.locator_params(axis="x", nbins=max(2, 40 // (longest + 2)))
+    drawings.append(_drawn(plt, figure, "narrow"))
     plt.close(figure)
     return "".join(drawings)
 
@@ -55,24 +59,51 @@ def _drawn(plt, figure, kind):
     return text[text.index("<svg"):].replace("<svg ", f'<svg class="{kind}" ', 1)
 
 
-def trace(axes, x, y, **style):
-    """A line, or the band between extremes where there are more samples than a plot can show."""
-    limit = 12000
-    if len(x) <= limit:
-        axes.plot(x, y, **style)
-        return
-    group = -(-len(x) // (limit // 4))
-    whole = len(x) // group * group
-    parts = y[:whole].reshape(-1, group)
-    axes.fill_between(x[:whole:group], parts.min(axis=1), parts.max(axis=1),
-                      color=style.get("color"), linewidth=0.4)
+def draw(axes, plot):
+    """The plot on axes of matplotlib, with the legend beside the data where there is one."""
+    plot = figures.reduced(plot, 6000)
+    places = plot.places() if plot.curves else np.empty(0)
+    if plot.image:
+        axes.imshow(figures.palette()[plot.image.values], origin="lower", aspect="auto", extent=(
+            plot.image.left, plot.image.right, plot.image.bottom, plot.image.top))
+        axes.grid(False)
+    for curve in plot.curves:
+        colour = COLOURS[curve.colour]
+        if plot.bars:
+            axes.bar(places, curve.values, width=0.92 * plot.step, color=colour, label=curve.name)
+        elif curve.highs is not None:
+            axes.fill_between(places, curve.values, curve.highs, color=colour, linewidth=0.4, label=curve.name)
+        else:
+            axes.plot(places, curve.values, "." if curve.dots else "-", color=colour, linewidth=0.9, markersize=3,
+                      label=curve.name)
+    for y, label in plot.levels:
+        axes.axhline(y, color=GREY, linewidth=0.8, linestyle="--", label=label)
+    for x, label in plot.verticals:
+        axes.axvline(x, color=WARM, linewidth=1.2, label=label)
+    for mark in plot.marks:
+        axes.plot(mark.x, mark.y, "o", color=COLOURS[mark.colour], markersize=3.2)
+        if mark.label:
+            axes.annotate(mark.label, (mark.x, mark.y), xytext=(0, 5), textcoords="offset points", ha="center",
+                          fontsize=7.5)
+    axes.set(title=plot.title, xlabel=plot.x_label, ylabel=plot.y_label)
+    axes.margins(x=0.005)
+    if plot.y_range and all(map(math.isfinite, plot.y_range)):
+        axes.set_ylim(*plot.y_range)
+    if plot.x_range:
+        axes.set_xlim(*plot.x_range)
+    if len(plot.curves) + len(plot.levels) + len(plot.verticals) > 1:
+        axes.legend(frameon=False, fontsize=8, loc="upper left", bbox_to_anchor=(1.0, 1.0))
 
 
-def decades(axes, values):
-    """A logarithmic scale over the decades that matter, where there are any."""
-    top = values.max()
-    if top > 0 and math.isfinite(top):
-        axes.set_yscale("log")
-        axes.yaxis.set_major_formatter(lambda value, _: f"{value:g}")  # as text, not as a formula
-        positive = values[values > 1e-12 * top]
-        axes.set_ylim(max(positive.min(), 1e-2 * np.median(positive)) / 1.5, 1.6 * top)
+def save(plots, path, command, heights=None):
+    """Writes the plots, one above the other, to a file whose ending says the format."""
+    plt = pyplot()
+    figure, all_axes = plt.subplots(len(plots), 1, figsize=(10, 3.0 * len(plots) + 1), squeeze=False,
+                                    gridspec_kw={"height_ratios": heights})
+    for axes, plot in zip(all_axes[:, 0], plots):
+        draw(axes, plot)
+    os.makedirs(os.path.dirname(path) or ".", exist_ok=True)
+    marked = {"metadata": {"Creator": outputs.mark(command)}} if path.lower().endswith(".svg") else {}
+    with outputs.whole(path) as part:
+        figure.savefig(part, **marked)
+    plt.close(figure)

@@ -1,32 +1,26 @@
-"""Fits of a model to two columns of a table. The fits are done by exports; what stands here is which
-columns they are given, and how the result is told and shown."""
+"""Fits of a model to two columns of a table: which columns they are, and how the result is told and shown."""
 
 import dataclasses
-import os
-from collections.abc import Callable
+import math
 
 import numpy as np
 
-from . import outputs, recording
-from .calls import call
+from . import drawing, figures, recording
+from . import fit as topic
 from .files import InputError
+from .sections import number, uncertain
 
-ITERATIONS, TOLERANCE = 2000, 1e-12
-NATURAL = 2.71828  # the exports take these digits for e
-
-
-@dataclasses.dataclass
-class Model:
-    formula: str
-    parameters: list
-    value: Callable  # (x, parameters) to what the formula says
-    fit: Callable  # (x, y, w, options) to fit and parameters
+METHODS = ("least squares", "absolute", "bisquare")
+FORMULAS = {"line": ("a x + b", "ab"), "exponential": ("a exp(b x) + c", "abc"), "power": ("a x^b + c", "abc"),
+            "logarithm": ("a ln(b x)", "ab"), "gaussian": ("a exp(-((x - m) / s)^2 / 2) + c", "amsc")}
+TIED = 0.9999  # correlation of parameters of which only a combination is known
+FAR = 100.0  # times the range of the data
 
 
 @dataclasses.dataclass
 class Options:
     """What a fit may be told, values by the names of the parameters."""
-    method: int = 0  # 0 least squares, 1 least absolute residuals, 2 bisquare
+    method: int = 0  # of METHODS
     guess: dict = dataclasses.field(default_factory=dict)
     lower: dict = dataclasses.field(default_factory=dict)
     upper: dict = dataclasses.field(default_factory=dict)
@@ -42,99 +36,22 @@ class Columns:
 
 
 @dataclasses.dataclass
-class Fit:
-    model: Model
-    parameters: list
+class Fitted:
+    fit: topic.Fit
     columns: Columns
-    values: np.ndarray  # of the model at x
-    deviation: float  # sqrt of the sum of w r^2 over the degrees of freedom
-    mean_absolute: float  # the mean of |w r|
-    r_square: float
-
-    @property
-    def residuals(self):
-        return self.columns.y - self.values
+    warnings: list
 
 
-def _bounds(model, options):
-    return ([options.lower.get(name, -np.inf) for name in model.parameters],
-            [options.upper.get(name, np.inf) for name in model.parameters])
-
-
-def _guess(model, options):
-    if not options.guess:
-        return []
-    missing = [name for name in model.parameters if name not in options.guess]
-    if missing:
-        raise ValueError(f"the guess has no value for {', '.join(missing)}")
-    return [options.guess[name] for name in model.parameters]
-
-
-def _line(x, y, w, options):
-    lower, upper = _bounds(MODELS["line"], options)
-    if options.method == 0:
-        fit, *parameters, _ = call("BoundLinearFit_head", y, x, w, lower, upper)
-    else:
-        export = ("BoundLinearFitLAR_head", "BoundLinearFitBi_head")[options.method - 1]
-        fit, _, *parameters, _ = call(export, y, x, w, TOLERANCE, ITERATIONS, lower, upper)
-    return fit, parameters
-
-
-def _bounded(export, name):
-    def fit(x, y, w, options):
-        model = MODELS[name]
-        values, _, *parameters, _ = call(export, y, x, w, TOLERANCE, ITERATIONS,
-                                         _guess(model, options), *_bounds(model, options), options.method)
-        return values, parameters
-    return fit
-
-
-def _logarithm(x, y, w, options):
-    model = MODELS["logarithm"]
-    values, _, *parameters, _ = call("BoundLogFit_head", y, x, w, NATURAL, ITERATIONS,
-                                     _guess(model, options), *_bounds(model, options), options.method,
-                                     TOLERANCE)
-    return values, parameters
-
-
-MODELS = {
-    "line": Model("a x + b", ["a", "b"], lambda x, p: p[0] * x + p[1], _line),
-    "exponential": Model("a exp(b x) + c", ["a", "b", "c"], lambda x, p: p[0] * np.exp(p[1] * x) + p[2],
-                         _bounded("BoundExpFit_head", "exponential")),
-    "power": Model("a x^b + c", ["a", "b", "c"], lambda x, p: p[0] * x**p[1] + p[2],
-                   _bounded("BoundPowerFit_head", "power")),
-    "logarithm": Model("a ln(b x)", ["a", "b"], lambda x, p: p[0] * np.log(p[1] * x), _logarithm),
-    "gaussian": Model("a exp(-((x - m) / s)^2 / 2) + c", ["a", "m", "s", "c"],
-                      lambda x, p: p[0] * np.exp(-0.5 * ((x - p[1]) / p[2])**2) + p[3],
-                      _bounded("BoundGaussianFit_head", "gaussian")),
-}
-
-
-def polynomial(order):
-    if order < 0:
-        raise ValueError(f"no polynomial of order {order}")
-    names = [f"c{j}" for j in range(order + 1)]
-
-    def fit(x, y, w, options):
-        if options.method:
-            raise ValueError("a polynomial is fitted by least squares only")
-        if options.guess or options.lower != options.upper:
-            raise ValueError("a polynomial takes fixed coefficients, but no guess and no bounds")
-        fixed = [names.index(name) for name in options.lower]
-        values, parameters, _ = call("PolyFit81_head", x, y, order, w, 0, fixed,
-                                     list(options.lower.values()))
-        return values, list(parameters)
-    terms = ["c0", "c1 x", *(f"c{j} x^{j}" for j in range(2, order + 1))]
-    formula = " + ".join(terms[:order + 1] if order < 5 else [*terms[:3], "...", terms[order]])
-    return Model(formula, names, lambda x, p: np.polynomial.polynomial.polyval(x, p), fit)
-
-
-def model_of(name, order=2):
-    if name == "polynomial":
-        return polynomial(order)
-    if name not in MODELS:
-        raise ValueError(f"no model {name!r}; there are {', '.join(MODELS)} and polynomial")
-    return MODELS[name]
+def parameters_of(model, order=2):
+    """The formula of a model and the names of its parameters."""
+    if model == "polynomial":
+        if order < 0:
+            raise ValueError(f"no polynomial of order {order}")
+        return f"polynomial of order {order}", [f"c{j}" for j in range(order + 1)]
+    if model not in FORMULAS:
+        raise ValueError(f"no model {model!r}; there are {', '.join(FORMULAS)} and polynomial")
+    formula, names = FORMULAS[model]
+    return formula, list(names)
 
 
 def _label(layout, column):
@@ -179,53 +96,100 @@ def _columns_of(reader, x, y, weights, by_rows):
                    y_label=_label(layout, chosen["y"]))
 
 
-def fit(model, columns, options=Options()):
+def fit(model, columns, options=Options(), order=2):
+    """Fits a model by its name."""
+    formula, names = parameters_of(model, order)
     for name in {**options.guess, **options.lower, **options.upper}:
-        if name not in model.parameters:
-            raise ValueError(f"{model.formula} has no parameter {name}")
-    x, y, w = columns.x, columns.y, columns.w
-    values, parameters = model.fit(x, y, w, options)
-    fixed = sum(name in options.lower and options.lower[name] == options.upper.get(name)
-                for name in model.parameters)
-    freedom = len(y) - len(parameters) + fixed
-    deviation, r_square = float("nan"), float("nan")
-    if freedom > 0 and len(y) > 1:
-        _, r_square, deviation = call("GoodnessOfFit_head", y, values, np.abs(w), freedom)
-    weighted = (y - values) * (np.abs(w) if len(w) else 1.0)
-    return Fit(model, parameters, columns, values, deviation,
-               call("Mean_head", np.abs(weighted)), r_square)
+        if name not in names:
+            raise ValueError(f"{formula} has no parameter {name}")
+    with np.errstate(divide="ignore"):
+        sigma = 1 / np.sqrt(np.abs(columns.w)) if len(columns.w) else None
+    if model == "polynomial":
+        if options.method:
+            raise ValueError("a polynomial is fitted by least squares only")
+        if options.guess or options.lower != options.upper:
+            raise ValueError("a polynomial takes fixed coefficients, but no guess and no bounds")
+        found = topic.polynomial(columns.x, columns.y, order, sigma, options.lower)
+    else:
+        bounds = {name: (options.lower.get(name, -math.inf), options.upper.get(name, math.inf))
+                  for name in {**options.lower, **options.upper}}
+        said = {"bounds": bounds, "method": METHODS[options.method]}
+        if model != "line":
+            said["guess"] = options.guess or None
+        found = getattr(topic, model)(columns.x, columns.y, sigma, **said)
+    return Fitted(found, columns, doubts(model, found, columns))
+
+
+def doubts(model, found, columns):
+    """Why parameters may mean nothing, in sentences."""
+    free = [name for name in found.parameters if found.errors[name] != 0]
+    if found.dof <= 0:
+        return ["there are no more samples than parameters, so that nothing says how well they are known"]
+    said = []
+    unknown = [name for name in free if not math.isfinite(found.errors[name])]
+    if unknown:
+        said.append(f"the data do not determine {', '.join(unknown)}")
+    said += [f"{one} and {other} are known only together: their correlation is {value:.6f}"
+             for one, other, value in _tied(found)] if model != "polynomial" else []
+    if model in ("exponential", "power", "gaussian"):
+        height, spread = found.parameters["a"], float(np.ptp(columns.y))
+        if 2 * found.errors["a"] > abs(height):
+            said.append(f"a is below twice its standard error: there may be no {model} in the data")
+        if abs(height) > FAR * spread:
+            said.append(f"a is {abs(height) / spread:.2g} times the range of the data, which do not reach there")
+    if model == "gaussian" and not columns.x.min() <= found.parameters["m"] <= columns.x.max():
+        said.append("m is outside the data, which have no top of a bell")
+    return said
+
+
+def _tied(found):
+    """Pairs of parameters with a correlation above TIED, and the correlation."""
+    names, covariance = list(found.parameters), found.covariance
+    deviations = np.sqrt(np.diagonal(covariance))
+    for i in range(len(names)):
+        for j in range(i):
+            product = deviations[i] * deviations[j]
+            if product > 0 and math.isfinite(product) and abs(covariance[i, j]) > TIED * product:
+                yield names[j], names[i], covariance[i, j] / product
 
 
 def lines(result):
     """The result for the terminal."""
-    yield f"{result.columns.y_label} = {result.model.formula}, x = {result.columns.x_label}"
-    for name, value in zip(result.model.parameters, result.parameters):
-        yield f"  {name:<4} {value:.10g}"
-    yield f"{len(result.values)} samples, standard deviation of the residuals {result.deviation:.6g},"
-    yield f"  mean absolute residual {result.mean_absolute:.6g}, R^2 {result.r_square:.8g}"
+    found, columns = result.fit, result.columns
+    yield f"{columns.y_label} = {found.formula}, x = {columns.x_label}"
+    for name, value in found.parameters.items():
+        if found.errors[name]:
+            value, error = uncertain(value, found.errors[name])
+            yield f"  {name:<4} {value} ± {error}"
+        else:
+            yield f"  {name:<4} {value:.10g}"
+    weighted = found.residuals * np.abs(columns.w) if len(columns.w) else found.residuals
+    yield f"{len(found.values)} samples, standard deviation of the residuals {number(_deviation(found))},"
+    yield f"  mean absolute residual {np.mean(np.abs(weighted)):.6g}, R^2 {found.r_square:.8g}"
+    yield from (f"Warning: {warning}." for warning in result.warnings)
+
+
+def _deviation(found):
+    return found.rmse if found.dof > 0 else math.nan
+
+
+def plots(result):
+    """Data and fit, and residuals."""
+    found, columns = result.fit, result.columns
+    fine = np.linspace(columns.x.min(), columns.x.max(), 500)
+    x = np.concatenate([columns.x, fine])
+    data = np.concatenate([columns.y, np.full(len(fine), np.nan)])
+    order = np.argsort(x, kind="stable")
+    with np.errstate(all="ignore"):
+        curve = found.predict(x[order])
+    rest = np.argsort(columns.x, kind="stable")
+    return [figures.Plot("", columns.x_label, columns.y_label,
+                         [figures.Curve("data", data[order], figures.GREY, dots=True),
+                          figures.Curve(found.formula, curve)], x=x[order]),
+            figures.Plot("", columns.x_label, "residual",
+                         [figures.Curve("residual", found.residuals[rest], figures.WARM, dots=True)], x=columns.x[rest])]
 
 
 def plot(result, path):
     """Data and fit above, residuals below; the suffix of the path says the format."""
-    from . import drawing
-    plt = drawing.pyplot()
-    columns = result.columns
-    order = np.argsort(columns.x, kind="stable")
-    fine = np.linspace(columns.x.min(), columns.x.max(), 500)
-    figure, (above, below) = plt.subplots(2, 1, figsize=(8, 5.5), sharex=True,
-                                          gridspec_kw={"height_ratios": [3, 1]})
-    dense = len(order) > 500
-    above.plot(columns.x, columns.y, ".", color=drawing.GREY, markersize=2 if dense else 5, label="data")
-    above.plot(fine, result.model.value(fine, result.parameters), color=drawing.BLUE, linewidth=1.6,
-               label=result.model.formula)
-    above.set(ylabel=columns.y_label)
-    above.legend(frameon=False)
-    below.axhline(0, color=drawing.GREY, linewidth=0.8)
-    below.plot(columns.x[order], result.residuals[order], "." if dense else ".-", color=drawing.WARM,
-               linewidth=0.7, markersize=2 if dense else 4)
-    below.set(xlabel=columns.x_label, ylabel="residual")
-    os.makedirs(os.path.dirname(path) or ".", exist_ok=True)
-    marked = {"metadata": {"Creator": outputs.mark("fit")}} if path.lower().endswith(".svg") else {}
-    with outputs.whole(path) as part:
-        figure.savefig(part, **marked)
-    plt.close(figure)
+    drawing.save(plots(result), path, "fit", [2, 1])

@@ -19,7 +19,7 @@ from .files import COMPRESSED, InputError
 from .stored import ENDINGS as STORED
 
 TABLES = (".csv", ".txt", ".tsv", ".tab", ".dat", ".asc", ".prn")
-MAIN = ("Mean", "Root mean square", "Standard deviation", "Strongest above 0 at")
+MAIN = ("Mean", "Root mean square", "Standard deviation", "Strongest part at", "Resolution")
 
 
 @dataclasses.dataclass
@@ -29,6 +29,7 @@ class Outcome:
     name: str
     page: str = ""
     cells: tuple = ()  # of the table in the index
+    thumbnail: str = ""  # a drawing, as SVG
     failure: str = ""
 
 
@@ -77,13 +78,15 @@ def files_of(paths):
 def report_on(name, path, options):
     """The outcome of one recording; runs in a worker."""
     try:
-        from . import recording, report
+        from . import pages, recording, report, sections_recording
         read = recording.read(path, **options)
         sections = report.sections_of(read)
-        rows = {row.label: f"{row.value} {row.unit}".strip() for section in sections for row in section.rows}
+        rows = {row.label: " ".join(filter(None, (row.value, row.error and f"± {row.error}", row.unit)))
+                for section in sections for row in section.rows}
         rate = f"{read.rate:.6g}" if read.rate else ""
         return Outcome(name, report.page(read, sections),
-                       (str(len(read.values)), rate, *(rows.get(label, "") for label in MAIN)))
+                       (str(len(read.values)), rate, *(rows.get(label, "") for label in MAIN)),
+                       pages.thumbnail(sections_recording.outline(read, "").curves[0]))
     except InputError as error:
         return Outcome(name, failure=str(error))
     except Exception as error:  # whatever it is, the others go on
@@ -159,23 +162,24 @@ def _finished(executor, pairs, options, left):
 
 def index(found, left=()):
     """The page that leads to the others."""
-    from .pages import HEAD, STYLE
+    from . import pages
     escape = html.escape
-    header = "".join(f"<th>{label}</th>" for label in ("Recording", "Samples", "Per second", *MAIN))
+    header = "".join(f'<th><button type="button">{label}</button></th>' for label in (
+        "Recording", "Samples", "Per second", *MAIN))
     rows = "".join(
-        f'<tr><td><a href="{escape(_link(outcome.name), quote=True)}">{escape(outcome.name)}</a></td>'
+        f'<tr><td>{outcome.thumbnail}</td>'
+        f'<td><a href="{escape(_link(outcome.name), quote=True)}">{escape(outcome.name)}</a></td>'
         + "".join(f'<td class="value">{escape(cell)}</td>' for cell in outcome.cells) + "</tr>\n"
         for outcome in found if not outcome.failure)
     failed = "".join(f"<li>{escape(outcome.failure)}</li>\n" for outcome in found if outcome.failure)
     others = "".join(f"<li>{escape(path)}</li>\n" for path in left)
     read = sum(not outcome.failure for outcome in found)
-    return (f'<!DOCTYPE html>\n<html lang="en"><head>{HEAD}{outputs.generator("report")}'
-            f"<title>Recordings</title><style>{STYLE}"
-            "div.wide { overflow-x: auto; }</style></head><body><h1>Recordings</h1>"
-            f"<p>{read} of {len(found)} recordings were read.</p>"
-            f'<div class="wide"><table><tr>{header}</tr>\n{rows}</table></div>'
-            + (f"<h2>Not read</h2><ul>{failed}</ul>" if failed else "")
-            + (f"<h2>Left out by their endings</h2><ul>{others}</ul>" if others else "") + "</body></html>\n")
+    inner = (f"<p>{read} of {len(found)} recordings were read. A click on the name of a column sorts by it.</p>"
+             f'<div class="wide"><table class="sorted"><thead><tr><th></th>{header}</tr></thead>\n'
+             f"<tbody>{rows}</tbody></table></div>"
+             + (f"<h2>Not read</h2><ul>{failed}</ul>" if failed else "")
+             + (f"<h2>Left out by their endings</h2><ul>{others}</ul>" if others else ""))
+    return pages.page("report", "Recordings", inner, scripts=pages.own_script("index.js"))
 
 
 def _link(name):

@@ -420,7 +420,7 @@ def levels(x: ArrayLike, method: Literal["auto", "histogram", "peak"] = "auto", 
     x : array_like
         Real samples, of any dimension.
     method : {"auto", "histogram", "peak"}
-        The modes of the histogram, the extremes, or whichever fits.
+        The modes of the histogram, refined by the samples about them; the extremes; or whichever fits.
     bins : int
         Of the histogram.
     axis : int
@@ -441,11 +441,16 @@ def levels(x: ArrayLike, method: Literal["auto", "histogram", "peak"] = "auto", 
     --------
     >>> import qx
     >>> [round(one, 2) for one in qx.measure.levels(qx.signals.square(1000, 0.01) + 1)]
-    [2.0, 0.0, 1.99]
+    [2.0, 0.0, 2.0]
     """
     code = chosen("measure.levels", "method", method, LEVELS)
     bins = whole_number("measure.levels", "bins", bins, 1, "ErrMeasureEmptyChannel")
-    return by_channel(lambda channel: Levels(*core.levels(channel, 0.0, 1.0, code, bins, 0)), x, axis)
+    return by_channel(lambda channel: _levels(channel, code, bins), x, axis)
+
+
+def _levels(x: NDArray[Any], code: int, bins: int) -> Levels:
+    (high, _), (low, _) = measuring.levels(x.astype(float), code, bins)
+    return Levels(high, low, high - low)
 
 
 def pulses(x: ArrayLike, fs: float = 1.0, first: Literal["rising", "falling"] = "rising", axis: int = LAST) -> Any:

@@ -187,34 +187,78 @@ class Pulse:
     slew_rate: float  # of the first transition, per sample
     first_overshoot: float  # beyond the state that the first transition leads to
     second_overshoot: float
+    low_error: float = 0.0  # standard uncertainties of the levels
+    high_error: float = 0.0
 
 
 HISTOGRAM = {"method": AUTOMATIC, "bins": BINS}
 
 
-def transition(values, direction, number):
-    """slewRate, duration, start, end and the overshoot in its direction."""
-    found = call("TransMeas", values, 0.0, 1.0, direction, number, REFERENCES, HISTOGRAM, 0)[1:]
+NEAR = 1.5  # bins around a level whose samples are its state
+ROUNDS = 50
+
+
+def state_level(values, level, width):
+    """The mean of the samples within NEAR bins of a level, about which they are taken anew until they
+    stay, and its standard uncertainty from their scatter."""
+    near = values[np.abs(values - level) <= NEAR * width]
+    for _ in range(ROUNDS):
+        if not len(near):
+            return level, width / 12**0.5
+        mean = near.mean()
+        again = values[np.abs(values - mean) <= NEAR * width]
+        if len(again) == len(near):
+            break
+        near = again
+    return float(mean), float(near.std(ddof=1) / len(near)**0.5) if len(near) > 1 else width / 12**0.5
+
+
+def levels(values, method=AUTOMATIC, bins=BINS):
+    """High and low level as pairs with their standard uncertainties. Modes of the histogram, which are
+    centres of bins, are refined by the samples about them; extremes, where the waveform has no modes,
+    are what they are."""
+    high, low, _ = call("StateLevels", values, 0.0, 1.0, method, bins, 0)
+    least, greatest = float(values.min()), float(values.max())
+    width = (greatest - least) / bins
+    if high == greatest and low == least or not width > 0:
+        return (high, 0.0), (low, 0.0)
+    found = state_level(values, high, width), state_level(values, low, width)
+    return found if found[0][0] > found[1][0] else ((high, width / 12**0.5), (low, width / 12**0.5))
+
+
+def references(high, low):
+    """The levels at which edges are timed, as values."""
+    return {name: low + (high - low) * percent / 100 for name, percent in (("high", 90), ("mid", 50), ("low", 10))} \
+        | {"percent": 0}
+
+
+def transition(values, direction, number, high, low):
+    """slewRate, duration, start, end and the overshoot in its direction, between refined levels."""
+    found = call("TransMeas", values, 0.0, 1.0, direction, number, references(high, low), HISTOGRAM, 0)[1:]
     under, over = found[-2:]
-    return *found[:4], over if direction == RISING else under
+    modes = call("StateLevels", values, 0.0, 1.0, AUTOMATIC, BINS, 0)[:2]
+    # The export refers to the modes of the histogram.
+    share, beyond = (over, modes[0] - high) if direction == RISING else (under, low - modes[1])
+    excess = share / 100 * (modes[0] - modes[1]) + beyond
+    return *found[:4], max(0.0, 100 * excess / (high - low))
 
 
 def pulse(values, number=1, direction=RISING):
     """Pulse `number` that begins with an edge of this direction, or None where there is none."""
     try:
-        high, low, _ = call("StateLevels", values, 0.0, 1.0, AUTOMATIC, BINS, 0)
-        width, middle = (call("PulseMeasEx", values, 0.0, 1.0, direction, 1, number, REFERENCES,
+        (high, high_error), (low, low_error) = levels(values)
+        width, middle = (call("PulseMeasEx", values, 0.0, 1.0, direction, 1, number, references(high, low),
                               HISTOGRAM, 0)[i] for i in (1, 3))
-        first = transition(values, direction, number)
-        second = transition(values, 1 - direction, number)
+        first = transition(values, direction, number, high, low)
+        second = transition(values, 1 - direction, number, high, low)
         if second[2] < first[3]:  # the waveform begins with an edge of the other direction
-            second = transition(values, 1 - direction, number + 1)
+            second = transition(values, 1 - direction, number + 1, high, low)
     except QxError as error:
         if error.name.startswith("ErrMeasure"):
             return None
         raise
     return Pulse(direction == RISING, low, high, first[2], second[3], first[1], second[1], middle, width, first[0],
-                 first[4], second[4])
+                 first[4], second[4], low_error, high_error)
 
 
 MOST_PULSES = 1000

@@ -1,31 +1,113 @@
-"""The style that all pages share."""
+"""What all pages share: their style, their plots, and the frame of a page.
 
-# For all pages: plots in the size of the window, and dark where the reader prefers it. The drawings
-# have no ground of their own, so turning their colours round does it for them.
-COMMON_STYLE = """
-:root { color-scheme: light dark; --text: #1f2d3d; --ground: #fff; --quiet: #5b6b7d; --line: #dfe5ec;
-        --shade: #f5f7fa; --link: #2f6db3; }
-body { font: 15px/1.5 "DejaVu Sans", "Segoe UI", Helvetica, Arial, sans-serif; color: var(--text);
-       max-width: 62em; margin: 2em auto; padding: 0 1.2em; background: var(--ground); }
-figure { margin: 0 0 .6em; } figure svg { width: 100%; height: auto; } figure svg.narrow { display: none; }
-@media (max-width: 640px) { body { margin: 1em auto; padding: 0 .8em; }
-  figure svg.wide:not(:only-child) { display: none; } figure svg.narrow { display: block; } }
-@media (prefers-color-scheme: dark) {
-  :root { --text: #dde4ec; --ground: #15191e; --quiet: #93a1b1; --line: #303a45; --shade: #1d232a;
-          --link: #7db2ea; }
-  figure svg { filter: invert(1) hue-rotate(180deg); } }
-@media print { figure svg.narrow { display: none; } }
+Plots are drawn in the page by dygraphs, from Debian's package libjs-dygraphs, which is put into the page so
+that it needs nothing from elsewhere. Where the package is missing they are drawings that stand still.
 """
-HEAD = ('<meta charset="utf-8"><meta name="viewport" content="width=device-width, initial-scale=1">')
 
-STYLE = COMMON_STYLE + """
-h1 { font-size: 1.6em; margin-bottom: .1em; overflow-wrap: anywhere; } h2 { font-size: 1.15em;
-     margin: 1.8em 0 .4em; border-bottom: 1px solid var(--line); padding-bottom: .2em; }
-p.source { color: var(--quiet); margin: .2em 0; overflow-wrap: anywhere; }
-table { border-collapse: collapse; } td, th { padding: .22em 1.4em .22em 0; text-align: left;
-     border-bottom: 1px solid var(--line); } td.value { text-align: right; white-space: nowrap;
-     font-variant-numeric: tabular-nums; padding-right: .5em; } td.export { color: var(--quiet);
-     font-family: "DejaVu Sans Mono", Consolas, monospace; font-size: .86em; overflow-wrap: anywhere; }
-table + figure { margin-top: 1em; } footer { margin-top: 3em; color: var(--quiet); font-size: .85em; }
-@media (max-width: 640px) { td, th { padding-right: .6em; } td.export { font-size: .7em; } }
-"""
+import functools
+import html
+import json
+from datetime import datetime, timezone
+from pathlib import Path
+
+from . import drawing, figures, outputs
+
+HERE = Path(__file__).parent
+DYGRAPHS = Path("/usr/share/javascript/dygraphs")
+POINTS = 300_000  # of all curves of a page, as lowest and highest values four bytes each
+STILL = "The plots stand still: to zoom in them, install Debian's package libjs-dygraphs and make the page anew."
+HEAD = ('<meta charset="utf-8"><meta name="viewport" content="width=device-width, initial-scale=1">'
+        '<meta http-equiv="Content-Security-Policy" content="default-src \'none\'; style-src \'unsafe-inline\'; '
+        'script-src \'unsafe-inline\'; img-src data:; connect-src \'self\'">')
+
+
+@functools.cache
+def style():
+    return (HERE / "page.css").read_text("utf-8")
+
+
+@functools.cache
+def dygraphs():
+    """The text of dygraphs and of its style; None where it is not installed."""
+    try:
+        return ((DYGRAPHS / "dygraph.min.js").read_text("utf-8").rpartition("//# sourceMappingURL")[0],
+                (DYGRAPHS / "dygraph.min.css").read_text("utf-8").rpartition("/*# sourceMappingURL")[0])
+    except OSError:
+        return None
+
+
+def script(text):
+    """A script as a part of a page, which nothing in it ends early."""
+    return "<script>" + text.replace("</script", "<\\/script") + "</script>"
+
+
+def data(value):
+    """A value for the scripts of a page, where no text of it can end the element."""
+    return json.dumps(value, allow_nan=False).replace("<", "\\u003c").replace(">", "\\u003e")
+
+
+def plots_of(sections):
+    return [figure for section in sections for figure in section.figures if isinstance(figure, figures.Plot)]
+
+
+def body(sections):
+    """The sections with their plots, and what the page needs to draw them."""
+    curves = sum(len(plot.curves) for plot in plots_of(sections))
+    most = max(1 << 9, min(figures.MOST_POINTS, POINTS // max(1, curves)))
+    text, described = [], []
+    for section in sections:
+        text.append(f"<section><h2>{html.escape(section.title)}</h2><p>{html.escape(section.text)}</p>")
+        text += table(section.rows)
+        for figure in section.figures:
+            if isinstance(figure, figures.Plot) and dygraphs():
+                text.append(f'<figure class="plot" data-plot="{len(described)}"></figure>')
+                described.append(figures.described(figure, most))
+            elif isinstance(figure, figures.Plot):
+                text.append(f'<figure class="still">{drawing.svg(figure)}</figure>')
+            else:
+                text.append(figure)
+        text.append("</section>")
+    if described:
+        text.append(f'<script type="application/json" id="plots">{data(described)}</script>')
+        text.append("<noscript><p>The plots are drawn by the browser, whose scripts are switched off.</p></noscript>")
+    return "\n".join(text)
+
+
+def table(rows):
+    if not rows:
+        return []
+    cells = "".join(f'<tr><td>{html.escape(row.label)}</td><td class="value">{html.escape(row.value)}'
+                    + (f' <span class="error">± {html.escape(row.error)}</span>' if row.error else "")
+                    + f'</td><td>{html.escape(row.unit)}</td><td class="source">{html.escape(row.source)}</td></tr>\n'
+                    for row in rows)
+    return [f'<div class="wide"><table><thead><tr><th>Quantity</th><th>Value</th><th></th><th>From</th></tr></thead>'
+            f"<tbody>{cells}</tbody></table></div>"]
+
+
+def own_script(name):
+    return script((HERE / name).read_text("utf-8"))
+
+
+def page(command, title, inner, sections=None, scripts=""):
+    """A whole page; `inner` is HTML below the title, before the sections; `scripts` are elements for its end."""
+    parts = dygraphs()
+    made = datetime.now(timezone.utc).strftime("%Y-%m-%d %H:%M UTC")
+    drawn = body(sections) if sections is not None else ""
+    moves = "data-plot=" in drawn
+    if not moves and sections is not None and plots_of(sections):
+        inner += f"<p class=\"quiet\">{html.escape(STILL)}</p>"
+    return (f'<!DOCTYPE html>\n<html lang="en"><head>{HEAD}{outputs.generator(command)}'
+            f"<title>{html.escape(title)}</title><style>{parts[1] if moves else ''}{style()}</style></head><body>\n"
+            f"<h1>{html.escape(title)}</h1>\n{inner}\n{drawn}\n"
+            f"<footer>Made {made} by python3 -m qx {command}.</footer>"
+            f"{script(parts[0]) + own_script('page.js') if moves else ''}{scripts}</body></html>\n")
+
+
+def thumbnail(curve):
+    """A small drawing of a curve, without axes."""
+    lows, highs = figures.extremes(curve.values, -(-len(curve.values) // 120), curve.highs)
+    least, span = float(lows.min()), float(highs.max() - lows.min()) or 1.0
+    points = [f"{i * 160 / max(1, len(lows) - 1):.1f},{39 - 38 * (value - least) / span:.1f}"
+              for i, pair in enumerate(zip(lows, highs)) for value in pair if value == value]
+    return ('<svg class="thumbnail" viewBox="0 0 160 40" role="img" aria-label="outline">'
+            f'<polyline points="{" ".join(points)}"/></svg>')

@@ -13,11 +13,13 @@ import re
 import numpy as np
 
 from . import audio, files, rates, stored, tables, times
-from .calls import call
+from .envelopes import Envelope
 from .files import InputError  # noqa: F401, for those who read recordings
+from .wholes import Whole
 
 WIDEST = 1e307  # with the margins of a plot still a double
 MOST_SAMPLES = 1 << 24  # that are kept of one recording
+MOST_CHANNELS = 64  # that a page shows
 
 
 @dataclasses.dataclass
@@ -31,6 +33,8 @@ class Recording:
     notes: list  # comment lines of the file
     choice: str = ""  # what was taken from the file, and why
     whole: object = None  # figures of the whole file (Whole) where the values are a part of it
+    envelope: object = None  # the outline of the whole file (Envelope) where the values are a part of it
+    others: list = dataclasses.field(default_factory=list)  # the other channels (Channel)
 
     def times(self):
         """The abscissae of the samples: seconds, or sample numbers without a rate."""
@@ -41,47 +45,16 @@ class Recording:
         return "s" if self.rate else "samples"
 
 
-class Whole:
-    """Figures of a recording that is too long to be kept, part by part."""
-
-    BLOCK = 4096  # samples between two points of the outline
-
-    def __init__(self):
-        self.count, self.total, self.squares = 0, 0.0, 0.0
-        self.lows, self.highs, self._rest = [], [], np.empty(0)
-
-    def add(self, values):
-        if not len(values):
-            return
-        n = len(values)
-        self.count += n
-        self.total += n * call("Mean_head", values)
-        rms = call("RMS_head", values)
-        self.squares += n * (rms * rms)  # beyond all numbers perhaps, and no error
-        values = np.concatenate([self._rest, values])
-        blocks = values[:len(values) // self.BLOCK * self.BLOCK].reshape(-1, self.BLOCK)
-        if len(blocks):
-            self.lows.append(blocks.min(axis=1))
-            self.highs.append(blocks.max(axis=1))
-        self._rest = values[blocks.size:].copy()
-
-    def outline(self):
-        """The least and the greatest values of blocks one after the other, the last one shorter."""
-        rest = [self._rest] if len(self._rest) else []
-        return (np.concatenate([*self.lows, *([part.min()] for part in rest)]),
-                np.concatenate([*self.highs, *([part.max()] for part in rest)]))
-
-    @property
-    def mean(self):
-        return self.total / self.count
-
-    @property
-    def rms(self):
-        return (self.squares / self.count) ** 0.5
-
-
 UNIT = re.compile(r"\[([^\]]+)\]|\(([^)]+)\)|(?:\s/\s*|/ ?)(\S+)$|"
                   r"^([munpkM]?(?:V|A|g|Pa|bar|m|W|N|K|Hz)|°C|%|dB)$")
+
+
+@dataclasses.dataclass
+class Channel:
+    """A channel that is shown beside the one that is analysed: its outline."""
+    channel: str
+    unit: str
+    envelope: object  # Envelope
 
 
 def read(path, rate=None, column=None, decimal=None, missing=None, start=0, time=None, dates=None,
@@ -141,16 +114,25 @@ def table_of(source, time, options, *wanted):
 
 
 def _of_audio(source, column, start):
-    whole = Whole()
+    whole = Whole(MOST_SAMPLES)
     path = source.local()
-    values, rate, channel, channels, frames = audio.read(source.path, path, column, start, MOST_SAMPLES, whole)
+    outlines = {}
+    values, rate, channel, channels, frames = audio.read(source.path, path, column, start, MOST_SAMPLES, whole,
+                                                         outlines)
+    shown = [Channel(f"channel {i + 1} of {channels}", "FS", outlines[i]) for i in sorted(outlines)[:MOST_CHANNELS]]
     others = f"; others: {_listed(f'channel {i + 1}' for i in range(channels) if i + 1 != channel)}"
     choice = f"channel {channel} of {channels}; {{rate}}{others * (channels > 1)}"
     choice += _part(start, len(values), frames)
     if wrong := audio.wrong_length(path, frames):
         choice += f"; {wrong}"
     return Recording(source.name, values, rate or None, "from the header of the file", "FS",
-                     f"channel {channel} of {channels}", [], choice, whole if whole.count else None)
+                     f"channel {channel} of {channels}", [], choice, *_if_longer(whole, start), others=shown)
+
+
+def _if_longer(whole, start):
+    """The figures and the outline of all samples where the values are a part of them."""
+    is_longer = whole.count > MOST_SAMPLES
+    return whole if is_longer else None, whole.envelope if is_longer and not start else None
 
 
 def _listed(names, most=12):
@@ -172,7 +154,9 @@ def _of_table(reader, column, time, missing, start, rate, habit):
     clocks, indices = _roles(reader, time)
     chosen = _column(reader, clocks, indices, column)
     time = None if rate else _time_column(reader, [c for c in clocks if c != chosen])
-    values, seconds, whole, said = _columns(reader, chosen, time, start)
+    others = [c for c in _numeric(reader) if c not in (chosen, time, *clocks, *indices)][:MOST_CHANNELS]
+    outlines = {c: Envelope() for c in others}
+    values, seconds, whole, said = _columns(reader, chosen, time, start, outlines)
     if not len(values):
         raise InputError(f"{path}: has no value from sample {start + 1} on")
     holes = np.isnan(values)
@@ -185,9 +169,9 @@ def _of_table(reader, column, time, missing, start, rate, habit):
     label, unit = _label(layout, chosen, reader.notes)
     choice = "; ".join([*_told_of_columns(reader, values, chosen, time, indices), *reader.told, *said])
     choice += _part(start, len(values), whole.count)
-    is_part = whole.count > MOST_SAMPLES
+    shown = [Channel(*_label(layout, c, reader.notes), outline) for c, outline in outlines.items()]
     return Recording(reader.name, values, rate, source, unit, label, reader.notes, choice,
-                     whole if is_part else None)
+                     *_if_longer(whole, start), others=shown)
 
 
 def _refuse_wrapped(reader, column):
@@ -269,14 +253,20 @@ def _column(reader, times, indices, column):
     layout, path = reader.layout, reader.path
     if column is not None:
         return column_called(path, layout, column)
-    numeric = [c for c in range(layout.width) if not reader.is_clock(c) and any(
-        layout.number(cell) is not None for cell in layout.sample(c))]
+    numeric = _numeric(reader)
     signals = [c for c in numeric if c not in times and c not in indices]
     if signals or layout.width == 1 and numeric:
         return (signals or numeric)[0]
     held = [f"{layout.label(c)}, holds {tables.shown(layout.body[0][c])}" for c in range(layout.width)]
     raise InputError(f"{path}: no column of numbers that is neither time nor a count of the rows: "
                      f"{_listed(held)}; --column takes one all the same")
+
+
+def _numeric(reader):
+    """The columns of numbers."""
+    layout = reader.layout
+    return [c for c in range(layout.width) if not reader.is_clock(c) and any(
+        layout.number(cell) is not None for cell in layout.sample(c))]
 
 
 def _time_column(reader, times):
@@ -295,18 +285,23 @@ def _date_beside(reader, time):
                  and not reader.is_of_day(c) and not any(":" in cell for cell in reader.layout.sample(c))), None)
 
 
-def _columns(reader, chosen, time, start):
-    """The values and the times, or None, from a sample on, the figures of all, and what is to be said of them."""
+def _columns(reader, chosen, time, start, outlines):
+    """The values and the times, or None, from a sample on, the figures of all, and what is to be said of them.
+    `outlines` has the Envelopes of other columns, which are filled; a column that cannot be read goes."""
     date = _date_beside(reader, time)
     columns = [c for c in dict.fromkeys((chosen, time, date)) if c is not None]
-    kept, seen, whole = {c: [] for c in columns}, 0, Whole()
-    for part, _ in reader.parts(columns):
-        count = len(part[chosen])
+    kept, seen, whole = {c: [] for c in columns}, 0, Whole(MOST_SAMPLES)
+    for part, _ in reader.parts(columns, outlines):
         first, last = max(0, start - seen), max(0, start + MOST_SAMPLES - seen)
-        seen += count
+        seen += len(part[chosen])
         for c in columns:
             kept[c].append(part[c][first:max(first, last)])
         whole.add(part[chosen][~np.isnan(part[chosen])])
+        for c in list(outlines):
+            if part[c] is None:
+                del outlines[c]
+            else:
+                outlines[c].add(part[c][first:])
     joined = {c: np.concatenate(parts) if parts else np.empty(0) for c, parts in kept.items()}
     seconds, said = joined.get(time), []
     if date is not None:

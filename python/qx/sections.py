@@ -9,7 +9,8 @@ class Row:
     label: str
     value: str
     unit: str
-    export: str  # the export behind the number, and what else went into it
+    source: str  # the function behind the number, and what else went into it
+    error: str = ""  # the standard uncertainty, in the unit of the value
 
 
 @dataclasses.dataclass
@@ -17,7 +18,7 @@ class Section:
     title: str
     text: str  # one paragraph
     rows: list = dataclasses.field(default_factory=list)
-    figures: list = dataclasses.field(default_factory=list)  # SVG texts
+    figures: list = dataclasses.field(default_factory=list)  # figures.Plot, or HTML texts
     terminal: list = dataclasses.field(default_factory=list)  # further lines for the terminal
 
 
@@ -33,9 +34,17 @@ def resolved(values, step):
         return [number(value) for value in values]
     place = math.floor(math.log10(step)) - 1  # of the last digit, one finer than the step
     if 1e-4 <= max(largest, step) < 1e7:
-        return [f"{value:.{max(0, -place)}f}" for value in values]
+        return [f"{value:.{min(17, max(0, -place))}f}" for value in values]
     digits = max(1, math.floor(math.log10(largest)) - place) if largest else 1
     return [f"{value:.{min(17, digits)}e}" for value in values]
+
+
+def uncertain(value, error):
+    """A value and its standard uncertainty as texts: the digits that hold, and two of the uncertainty."""
+    value, error = float(value), float(error)
+    if not (math.isfinite(value) and math.isfinite(error) and error > 1e-15 * abs(value)):
+        return number(value, 12), number(error, 2) if error > 0 or not math.isfinite(error) else ""
+    return resolved([value], error)[0], number(error, 2)
 
 
 def power_unit(unit, exponent):
@@ -50,8 +59,21 @@ def quantity(recording):
     return f"{name} ({recording.unit})" if recording.unit else name
 
 
-def frequency_axis(recording):
-    """The factor from cycles per sample and the label of an axis of frequencies."""
+def time_axis(recording):
+    """The label of an axis of times, with the distance of the samples."""
     if recording.rate:
-        return recording.rate, "Frequency (Hz)"
-    return 1.0, "Frequency (cycles per sample)"
+        return f"Time (s), a sample every {number(1 / recording.rate, 3)} s"
+    return "Time (samples)"
+
+
+def frequency_unit(recording):
+    return "Hz" if recording.rate else "cycles per sample"
+
+
+def frequency_axis(recording, resolution=None):
+    """The factor from cycles per sample, and the label of an axis of frequencies; `resolution` is in
+    the unit of the axis."""
+    label = f"Frequency ({frequency_unit(recording)})"
+    if resolution:
+        label += f", resolution {number(resolution, 3)} {frequency_unit(recording)}"
+    return recording.rate or 1.0, label

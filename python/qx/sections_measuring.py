@@ -2,9 +2,9 @@
 
 import numpy as np
 
-from . import drawing, measuring
-from .calls import call
-from .sections import Row, Section, number, quantity
+from . import figures, measuring, stats
+from .sections import Row, Section, number, uncertain
+from .sections_recording import over_time
 
 
 def scale_of(recording):
@@ -14,53 +14,43 @@ def scale_of(recording):
 
 def marked(recording, found):
     """The whole recording with its events."""
-    plt = drawing.pyplot()
-    figure, axes = plt.subplots(figsize=(10, 2.9))
-    times = recording.times()
-    drawing.trace(axes, times, recording.values, color=drawing.BLUE, linewidth=0.7)
-    axes.plot(times[found], recording.values[found], "o", color=drawing.WARM, markersize=3.2)
-    axes.set(title=f"{len(found)} events", xlabel=f"Time ({recording.time_unit})",
-             ylabel=quantity(recording))
-    axes.margins(x=0.005)
-    return drawing.svg(plt, figure)
+    step, _ = scale_of(recording)
+    return over_time(recording, f"{len(found)} events", curves=[figures.Curve(recording.channel, recording.values)],
+                     marks=[figures.Mark(float(i * step), float(recording.values[i])) for i in found[:5000]])
 
 
 def measured(recording, pulse, part):
     """One pulse with its levels and where its transitions begin and end."""
     step, _ = scale_of(recording)
-    plt = drawing.pyplot()
-    figure, axes = plt.subplots(figsize=(10, 2.9))
     values = recording.values[part]
-    axes.plot(recording.times()[part], values, color=drawing.BLUE, linewidth=1.1)
-    for level in (pulse.low, pulse.high):
-        axes.axhline(level, color=drawing.GREY, linewidth=0.8, linestyle="--")
     ends = np.array([pulse.start, pulse.start + pulse.first_duration,
                      pulse.end - pulse.second_duration, pulse.end])
-    axes.plot((part.start + ends) * step, np.interp(ends, np.arange(len(values)), values), "o",
-              color=drawing.WARM, markersize=4)
+    marks = [figures.Mark(float((part.start + end) * step), float(np.interp(end, np.arange(len(values)), values)),
+                          label) for end, label in zip(ends, ("10%", "90%", "90%", "10%"))]
     half = (pulse.low + pulse.high) / 2
-    sides = (part.start + pulse.middle + np.array([-0.5, 0.5]) * pulse.width) * step
-    axes.plot(sides, [half, half], color=drawing.WARM, linewidth=1.4)
-    axes.set(title="One of them: levels, 10% and 90% of both edges, width at half height",
-             xlabel=f"Time ({recording.time_unit})", ylabel=quantity(recording))
-    axes.margins(x=0.005)
-    return drawing.svg(plt, figure)
+    marks += [figures.Mark(float((part.start + pulse.middle + side * pulse.width) * step), float(half), "50%")
+              for side in (-0.5, 0.5)]
+    plot = over_time(recording, "One of them: levels, 10%, 50% and 90% of both edges",
+                     curves=[figures.Curve(recording.channel, values)], marks=marks,
+                     levels=[(float(pulse.low), "low"), (float(pulse.high), "high")])
+    plot.start, plot.link = part.start * step, ""
+    return plot
 
 
 def interval_rows(recording, found):
     step, unit = scale_of(recording)
     intervals = np.diff(found) * step
-    rows = [Row("Events", str(len(found)), "", "PeakD of the slope's power")]
+    rows = [Row("Events", str(len(found)), "", "bursts of slope")]
     if recording.rate:
         rows.append(Row("Rate, by the median interval",
-                        number(60 / call("Median_head", intervals), 4),
-                        "1/min", "Median_head"))
+                        number(60 / stats.median(intervals), 4),
+                        "1/min", "stats.median"))
     for label, value, export in (
-            ("Median interval", call("Median_head", intervals), "Median_head"),
-            ("Shortest interval", intervals.min(), "PeakD"),
-            ("Longest interval", intervals.max(), "PeakD"),
+            ("Median interval", stats.median(intervals), "stats.median"),
+            ("Shortest interval", intervals.min(), "bursts of slope"),
+            ("Longest interval", intervals.max(), "bursts of slope"),
             ("Standard deviation of the intervals",
-             call("Moment_head", intervals, 2) ** 0.5, "Moment_head")):
+             stats.std(intervals), "stats.std")):
         rows.append(Row(label, number(value, 4), unit, export))
     return rows
 
@@ -68,17 +58,17 @@ def interval_rows(recording, found):
 def pulse_rows(recording, pulse):
     step, unit = scale_of(recording)
     first, second = ("Rise", "Fall") if pulse.rises else ("Fall", "Rise")
-    return [Row("Amplitude of one event", number(pulse.high - pulse.low, 4),
-                recording.unit, "StateLevels"),
+    amplitude, error = uncertain(pulse.high - pulse.low, np.hypot(pulse.high_error, pulse.low_error))
+    return [Row("Amplitude of one event", amplitude, recording.unit, "measure.pulses", error),
             Row(f"{first} between 10% and 90%", number(pulse.first_duration * step, 4), unit,
-                "TransMeas"),
+                "measure.pulses"),
             Row(f"{second} between 90% and 10%", number(pulse.second_duration * step, 4),
-                unit, "TransMeas"),
+                unit, "measure.pulses"),
             Row("Width at half height", number(pulse.width * step, 4), unit,
-                "PulseMeasEx"),
-            Row("Overshoot", number(pulse.first_overshoot, 3), "%", "TransMeas"),
+                "measure.pulses"),
+            Row("Overshoot", number(pulse.first_overshoot, 3), "%", "measure.pulses"),
             Row("Overshoot behind it", number(pulse.second_overshoot, 3), "%",
-                "TransMeas")]
+                "measure.pulses")]
 
 
 def events(recording):

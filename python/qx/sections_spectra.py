@@ -1,108 +1,148 @@
-"""Sections of the report: the amplitude spectrum and the averaged power spectrum."""
+"""Sections of the report: the amplitude spectrum with its tones, the averaged power spectrum, and the
+spectrum over time."""
 
 import math
 
 import numpy as np
 
-from . import drawing
-from .calls import call
-from .sections import Row, Section, frequency_axis, number, power_unit, resolved
+from . import figures, spectra, stats, tones
+from .sections import (Row, Section, frequency_axis, frequency_unit, number, power_unit, resolved, time_axis,
+                       uncertain)
+from .sections_recording import TIME
 
-HANNING = 1  # window selector
-DEFAULT = math.nan  # window parameter
+MOST_OF_TONES = 1 << 20  # samples in which tones are measured
+LONGEST = 1 << 17  # segment of an averaged spectrum
+SEGMENTS = 4  # without overlap, of a short one
+COLUMNS, LEVELS = 800, 80.0  # of the spectrum over time; decibels
+SQUARES = (1e-140, 1e140)  # values whose squares are numbers
 
 
-def amplitude_spectrum(recording):
-    """Frequencies in cycles per sample from 0 to one half, and the amplitudes of their parts."""
+def is_constant(recording):
+    return not np.ptp(recording.values) > 0
+
+
+def local_maxima(values):
+    """Indices of values that exceed both neighbours, the largest first."""
+    inner = np.flatnonzero((values[1:-1] > values[:-2]) & (values[1:-1] >= values[2:])) + 1
+    return inner[np.argsort(-values[inner], kind="stable")]
+
+
+def amplitudes(recording, window="blackman_harris"):
     n = len(recording.values)
-    half = n // 2 + 1
-    amplitudes = np.abs(call("ReOXFFTH80", recording.values, 0, n, 0)[:half]) / n
-    amplitudes[1:(n + 1) // 2] *= 2  # the two sides together; zero and Nyquist stand alone
-    return np.arange(half) / n, amplitudes
-
-
-def strongest(frequencies, values, count, apart):
-    """The indices of the greatest values that are so far apart from each other."""
-    found = []
-    for i in np.argsort(values)[::-1]:
-        if values[i] > 0 and all(abs(frequencies[i] - frequencies[j]) >= apart for j in found):
-            found.append(i)
-        if len(found) == count:
-            break
-    return found
-
-
-def amplitudes(recording):
-    if len(recording.values) < 2:
+    if n < 8:
         return None
-    scale, label = frequency_axis(recording)
-    frequencies, values = amplitude_spectrum(recording)
-    shown, frequencies = values[1:], scale * frequencies[1:]
-    unit = "Hz" if recording.rate else "per sample"
-    found = strongest(frequencies, shown, 5, 0.01 * frequencies[-1])
-    rows = [Row(f"At {label} {unit}", number(shown[i], 4), recording.unit, "ReOXFFTH80")
-            for i, label in zip(found, resolved(frequencies[found], frequencies[0]))]
-    plt = drawing.pyplot()
-    figure, axes = plt.subplots(figsize=(10, 3.1))
-    drawing.trace(axes, frequencies, np.maximum(shown, 1e-300), color=drawing.BLUE, linewidth=0.6)
-    drawing.decades(axes, shown)
-    axes.set(title="Amplitude spectrum of the whole recording", xlabel=label,
-             ylabel=f"Amplitude ({recording.unit})" if recording.unit else "Amplitude")
-    axes.margins(x=0.005)
-    return Section("Amplitude spectrum",
-                   f"Peak amplitudes of the sinusoids of the recording, {number(frequencies[0], 3)} "
-                   f"{unit} apart, without a window; the five strongest parts of the spectrum.",
-                   rows, [drawing.svg(plt, figure)])
+    if is_constant(recording):
+        return Section("Amplitude spectrum", "The recording is constant: it has no parts above 0.")
+    rate = recording.rate or 1.0
+    first = max(0, (n - MOST_OF_TONES) // 2)
+    values = recording.values[first:first + MOST_OF_TONES]
+    frequencies, shown, resolution = tones.spectrum(values, rate, window)
+    found = tones.strongest(values, rate)
+    unit = frequency_unit(recording)
+    rows, marks = [], []
+    if found:
+        pairs = [(uncertain(f, f_error), uncertain(a, a_error)) for f, f_error, a, a_error in zip(
+            found.frequencies, found.frequency_errors, found.amplitudes, found.amplitude_errors)]
+        rows.append(Row("Strongest part at", pairs[0][0][0], unit, "measure.tones", pairs[0][0][1]))
+        for (f, f_error), (a, a_error) in pairs:
+            at = f"{f} ± {f_error}" if f_error else f
+            rows.append(Row(f"Tone at {at} {unit}", a, recording.unit, "measure.tones", a_error))
+        marks = list(zip(found.frequencies, found.amplitudes))
+        text = "Tones that stand out of the noise around them, with standard uncertainties."
+    else:
+        peaks = local_maxima(shown)
+        text = "No tone stands out of the noise around it."
+        if len(peaks):
+            rows.append(Row("Strongest part at", resolved([frequencies[peaks[0]]], resolution)[0], unit,
+                            "spectra.periodogram", number(resolution / 2, 2)))
+    rows.append(Row("Resolution", number(resolution, 4), unit, "spectra.periodogram"))
+    if len(values) < n:
+        text += f" Of the {len(values)} samples in the middle."
+    largest = shown.max() or 1.0
+
+    def decibels(amplitude):
+        return 20 * (np.log10(np.maximum(amplitude / largest, 1e-15)) + math.log10(largest))
+
+    levels = decibels(shown)
+    top = max([levels.max(), *(decibels(a) for _, a in marks)])
+    plot = figures.Plot(
+        f"Amplitudes under a {window.replace('_', '-')} window", frequency_axis(recording, resolution)[1],
+        f"Amplitude (dB re 1 {recording.unit})" if recording.unit else "Amplitude (dB)",
+        [figures.Curve("spectrum", levels)], step=frequencies[1], may_be_log=True,
+        marks=[figures.Mark(float(f), float(decibels(a)), resolved([f], 10 * frequencies[1])[0]) for f, a in marks],
+        y_range=(max(float(np.median(levels)) - 40, top - 200), top + 8))
+    return Section("Amplitude spectrum", text, rows, [plot])
 
 
-def averaged_spectrum(x, length):
-    """The power density of x per cycle per sample, averaged over half-overlapped segments under a
-    window, from 0 to one half cycle per sample; and the number of segments."""
-    constants = call("WinConstByNameH", length, HANNING, DEFAULT)
-    total, segments = np.zeros(length), 0
-    for start in range(0, len(x) - length + 1, length // 2):
-        windowed = call("AllWinH", x[start:start + length], HANNING, DEFAULT, 0, 0)
-        total += call("SpectrumH", windowed)
-        segments += 1
-    # A spectrum of squares over length^2 has the window's power, length cg^2 enbw, in each value.
-    density = total[:length // 2 + 1] / segments * length / (constants["cg"]**2 * constants["enbw"])
-    density[1:(length + 1) // 2] *= 2
-    return np.arange(length // 2 + 1) / length, density, segments
+def segment_length(n):
+    return 2 ** max(3, min(int(math.log2(LONGEST)), int(math.log2(n / SEGMENTS))))
 
 
-def power(recording):
+def power(recording, window="hann"):
     n = len(recording.values)
     if n < 16:
         return None
-    scale, label = frequency_axis(recording)
-    length = 2 ** min(16, max(3, int(math.log2(n / 8))))
-    x = recording.values - call("Mean_head", recording.values)
-    largest = float(np.abs(x).max())
-    if not 1e-140 < largest < 1e140:
+    x = recording.values
+    largest = float(np.abs(x - x.mean()).max())
+    if not SQUARES[0] < largest < SQUARES[1]:
         what = (f"The squares of values around {largest:.2g} leave the range of numbers, so there is no "
                 "power spectrum." if largest else "The recording is constant: it has no power beside its "
                 "mean.")
         return Section("Averaged power spectrum", what)
-    frequencies, density, segments = averaged_spectrum(x, length)
-    frequencies, density = scale * frequencies, density / scale
+    rate = recording.rate or 1.0
+    if recording.whole:
+        found, variance = recording.whole.spectrum.result(rate), recording.whole.rms**2 - recording.whole.mean**2
+        of = f"of all {recording.whole.count} samples of the file"
+    else:
+        found, variance = spectra.welch(x, rate, window, segment_length(n)), stats.var(x)
+        of = "without their means"
     unit = f"{power_unit(recording.unit, 2) or '1'}/{'Hz' if recording.rate else 'cycle per sample'}"
-    decibels = 10 * np.log10(np.maximum(density, 1e-300))
-    plt = drawing.pyplot()
-    figure, axes = plt.subplots(figsize=(10, 3.1))
-    axes.plot(frequencies, decibels, color=drawing.BLUE, linewidth=1.1)
-    top = decibels[np.isfinite(decibels)].max(initial=-3000)
-    axes.set_ylim(max(decibels.min(), top - 120) - 3, top + 5)
-    axes.set(title=f"Power spectrum, mean of {segments} segments under a Hanning window",
-             xlabel=label, ylabel=f"Density (dB re 1 {unit})")
-    axes.margins(x=0.005)
-    step = frequencies[1]
-    rows = [Row("Power under the curve", number(density.sum() * step), power_unit(recording.unit, 2),
-                "SpectrumH, AllWinH"),
-            Row("Variance, for comparison", number(call("Moment_head", recording.values, 2)),
-                power_unit(recording.unit, 2), "Moment_head"),
-            Row("Strongest above 0 at", resolved([frequencies[1 + np.argmax(density[1:])]], step)[0],
-                "Hz" if recording.rate else "cycles per sample", "SpectrumH, AllWinH")]
-    return Section("Averaged power spectrum",
-                   f"{segments} half-overlapped segments of {length} samples, without the mean, "
-                   "scaled by the window's coherent gain and noise bandwidth (WinConstByNameH).",
-                   rows, [drawing.svg(plt, figure)])
+    decibels = 10 * np.log10(np.maximum(found.values, 1e-300))
+    top = float(decibels[np.isfinite(decibels)].max(initial=-3000))
+    plot = figures.Plot(
+        f"Power spectrum, mean of {found.segments} segments under a {window.replace('_', '-')} window",
+        frequency_axis(recording, found.resolution)[1], f"Density (dB re 1 {unit})",
+        [figures.Curve("density", decibels)], step=found.frequencies[1], may_be_log=True,
+        y_range=(max(float(decibels.min()), top - 120) - 3, top + 5))
+    squared = power_unit(recording.unit, 2)
+    rows = [Row("Power under the curve", number(found.power()), squared, "spectra.welch"),
+            Row("Variance, for comparison", number(variance), squared, "stats.var"),
+            Row("Resolution of the averaged spectrum", number(found.resolution, 4), frequency_unit(recording),
+                "spectra.welch")]
+    length = round(rate / found.frequencies[1])
+    return Section("Averaged power spectrum", f"{found.segments} half-overlapped segments of {length} samples, {of}.",
+                   rows, [plot])
+
+
+def over_time(recording, window="hann"):
+    """The density of power by time and frequency, in decibels."""
+    n = len(recording.values)
+    largest = float(np.abs(recording.values).max())
+    if n < 256 or not SQUARES[0] < largest < SQUARES[1] or is_constant(recording):
+        return None
+    rate = recording.rate or 1.0
+    length = 2 ** min(9, max(4, round(math.log2(2 * math.sqrt(n)))))
+    decibels, resolution = _columns(recording.values, rate, length, window)
+    top = float(decibels.max())
+    bottom = max(top - LEVELS, float(np.percentile(decibels, 2)))
+    shown = np.clip(np.round((decibels - bottom) / ((top - bottom) or 1.0) * 255), 0, 255).astype(np.uint8)
+    unit = f"{power_unit(recording.unit, 2) or '1'}/{'Hz' if recording.rate else 'cycle per sample'}"
+    image = figures.Image(shown, 0.0, n / rate, 0.0, rate / 2,
+                          f"Density from {number(bottom, 3)} dB (dark) to {number(top, 3)} dB (bright) re 1 {unit}")
+    plot = figures.Plot(
+        f"Spectrum over time, {length} samples ({number(length / rate, 3)} {recording.time_unit}) at a time",
+        time_axis(recording), frequency_axis(recording, resolution)[1],
+        x_range=(0.0, n / rate), y_range=(0.0, rate / 2), link=TIME, image=image)
+    return Section("Spectrum over time", f"{image.label}.", [], [plot])
+
+
+def _columns(x, rate, length, window):
+    """Decibels by frequency and time, no more columns than COLUMNS, each the mean of its segments."""
+    hop = max(length // 2, -(-len(x) // COLUMNS))
+    columns, resolution = [], 0.0
+    for start in range(0, len(x) - length + 1, hop):
+        part = x[start:start + max(length, hop)]
+        found = spectra.welch(part, rate, window, length, length // 2)
+        columns.append(found.values)
+        resolution = found.resolution
+    return 10 * np.log10(np.maximum(np.array(columns).T, 1e-300)), resolution

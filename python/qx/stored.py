@@ -50,13 +50,18 @@ class Arrays:
     def is_of_day(self, column):
         return False
 
-    def parts(self, columns):
+    def parts(self, columns, beside=()):
         start = 0
         while start < self.length:
             part = slice(start, min(start + ROWS_AT_ONCE, self.length))
             values = {c: self._values(c, part) for c in columns}
+            values |= {c: self._or_none(c, part) for c in beside}
             yield values, np.arange(part.start + 1, part.stop + 1)
             start = part.stop
+
+    def _or_none(self, column, part):
+        values = self.columns[column].values(part)
+        return np.where(np.isfinite(values), values, np.nan)
 
     def _values(self, column, part):
         values = self.columns[column].values(part)

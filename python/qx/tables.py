@@ -377,13 +377,25 @@ class Reader:
             while part := self._lines(lines):
                 yield *part, self.layout.separator, self.layout.width
 
-    def parts(self, columns):
+    def parts(self, columns, beside=()):
         """For each part of the body a dictionary of the columns, NaN where a value is missing, and
-        the line number of each row."""
+        the line number of each row. The columns `beside` are None in a part that has what is no number there."""
         for column in filter(self.is_clock, columns):
             self._settle(column)
         for numbers, lines, separator, width in self._parts_of_lines():
-            yield self._converted(numbers, lines, columns, separator, width)
+            values, at = self._converted(numbers, lines, columns, separator, width)
+            for column in beside:
+                values[column] = self._or_none(numbers, lines, column, separator, width)
+            yield values, at
+
+    def _or_none(self, numbers, lines, column, separator, width):
+        before, self.missing = self.missing, "skip"  # what is missing is a gap
+        try:
+            return self._converted(numbers, lines, [column], separator, width)[0][column]
+        except InputError:
+            return None
+        finally:
+            self.missing = before
 
     def _lines(self, lines):
         """The numbers and texts of the next lines of data."""

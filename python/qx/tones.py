@@ -1,69 +1,91 @@
-"""Tones of a recording, and the harmonics and noise beside the largest one."""
+"""Tones of a recording with their uncertainties, and the harmonics and noise beside the largest one."""
 
 import dataclasses
-import os
+import math
 
 import numpy as np
 
-from . import outputs
-from .calls import call
+from . import figures, measure, spectra
+from .outcomes import QxError
+from .sections import frequency_axis
 
-FALLING_AMPLITUDE = 0
-BLACKMAN_HARRIS_7, DEFAULT = 8, float("nan")  # window selector; side lobes below -160 dB
+WINDOW = "blackman_harris7"  # side lobes below -160 dB
 LEAST_DB = -300  # of the largest line; nothing below is drawn
+AROUND = 8  # bins to either side of a tone, whose noise is taken for that at the tone
+FREE = 10  # lines among them that are independent under the window, each of two degrees of freedom
+FALSE = 0.01  # chance that noise alone has a tone that counts
 
 
 @dataclasses.dataclass
 class Tones:
+    """Tones, the largest first; errors are standard uncertainties. A tone that `stands` is more than noise
+    of its neighbourhood would have."""
     frequencies: np.ndarray
-    amplitudes: np.ndarray  # of the peaks
-    phases: np.ndarray  # of cosines, at the first sample
-    residual_rms: float
-
-
-@dataclasses.dataclass
-class Harmonics:
-    frequencies: np.ndarray  # where they are seen; NaN where a harmonic cannot be told from others
+    frequency_errors: np.ndarray
     amplitudes: np.ndarray
-    phases: np.ndarray
-    thd: float  # a ratio
-    sinad: float  # dB, as the following
-    snr: float
-    sfdr: float
-    enob: float  # bits
-    noise_floor: float
+    amplitude_errors: np.ndarray
+    phases: np.ndarray  # of cosines, at the first sample
+    stands: np.ndarray
+    residual_rms: float
+    resolution: float  # one over the length of the recording
 
 
 def tones(values, rate=1.0, count=5):
-    """Up to `count` tones, the largest first; fewer where the rest could be noise."""
-    return Tones(*call("MultipleToneMeasurements", values, 1 / rate, count, FALLING_AMPLITUDE))
+    """Up to `count` tones, fewer where the rest could be noise; a QxError where all values are equal.
 
-
-def harmonics(values, rate=1.0, highest=10, fundamental=0.0, full_scale=0.0):
-    """A tone and its harmonics, up to `highest` or as many as the samples can tell. `fundamental` is
-    about where it is, 0 for the largest tone; `full_scale` the amplitude to which bits refer, 0 for
-    that of the tone."""
-    highest = max(1, min(highest, len(values) // 2 - 1))
-    return Harmonics(*call("HarmonicAnalysis", values, 1 / rate, fundamental, highest, full_scale))
-
-
-def spectrum(values):
-    """Frequencies in cycles per sample, and amplitudes as the lines under a window show them."""
+    The uncertainties are the least that an unbiased estimate from n samples has, with the density of the
+    noise about the tone, S, in place of that of white noise: sqrt(S fs / n) of the amplitude A, and
+    sqrt(3 S fs / (n (n^2 - 1))) fs / (pi A) of the frequency (D. C. Rife and R. R. Boorstyn, "Single-tone
+    parameter estimation from discrete-time observations", 1974). What a tone has about it that is no
+    tone, such as a changing amplitude, counts as noise. A tone stands where the ratio of its line to the mean of
+    those around it has a chance below FALSE in noise, by the F distribution and for n / 2 lines."""
     n = len(values)
-    window = call("AllWinH", np.ones(n), BLACKMAN_HARRIS_7, DEFAULT, 0, 0)
-    windowed = (values - call("Mean_head", values)) * window
-    half = n // 2 + 1
-    gain = n * call("Mean_head", window)
-    return np.arange(half) / n, 2 * np.abs(call("ReOXFFTH80", windowed, 0, n, 0)[:half]) / gain
+    scale = float(np.abs(values).max()) or 1.0
+    x = values / scale
+    found = measure.tones(x, rate, count)
+    t = np.arange(n) / rate
+    rest = x - x.mean()
+    for frequency, amplitude, phase in zip(found.frequencies, found.amplitudes, found.phases):
+        rest = rest - amplitude * np.cos(2 * math.pi * frequency * t + phase)
+    density = spectra.periodogram(rest, rate, "hann").values
+    at = np.round(found.frequencies * n / rate).astype(int)
+    noise = np.array([density[max(1, i - AROUND):i + AROUND + 1].mean() for i in at])
+    with np.errstate(divide="ignore"):
+        strength = found.amplitudes**2 * n / (2 * noise * rate)
+    return Tones(found.frequencies,
+                 rate * np.sqrt(3 * noise * rate / (n * (float(n)**2 - 1))) / (math.pi * found.amplitudes),
+                 scale * found.amplitudes, scale * np.sqrt(noise * rate / n), found.phases,
+                 strength > FREE * ((n / 2 / FALSE) ** (1 / FREE) - 1), scale * found.residual, rate / n)
 
 
-def plot(recording, found, analysis, path):
+def strongest(values, rate, count=5):
+    """The `tones` that stand out; None where there are none."""
+    try:
+        found = tones(values, rate, count)
+    except QxError as error:
+        if not error.name.startswith("ErrMeasure"):
+            raise
+        return None
+    kept = {field.name: getattr(found, field.name)[found.stands] for field in dataclasses.fields(found)
+            if isinstance(getattr(found, field.name), np.ndarray)}
+    return dataclasses.replace(found, **kept) if found.stands.any() else None
+
+
+def spectrum(values, rate=1.0, window=WINDOW):
+    """Frequencies, the amplitudes that lines under the window have, and the resolution."""
+    scale = float(np.abs(values).max()) or 1.0
+    found = spectra.periodogram(values / scale, rate, window, scaling="spectrum")
+    amplitudes = np.sqrt(2 * found.values)
+    amplitudes[0] = 0.0
+    if len(values) % 2 == 0:
+        amplitudes[-1] /= math.sqrt(2)
+    return found.frequencies, scale * amplitudes, found.resolution
+
+
+def plot(recording, found, analysis):
     """The spectrum in dB of the largest tone, with the tones and the harmonics."""
-    from . import drawing, sections
-    plt = drawing.pyplot()
-    figure, axes = plt.subplots(figsize=(10, 4))
-    scale, label = sections.frequency_axis(recording)
-    frequencies, amplitudes = spectrum(recording.values)
+    scale, _ = frequency_axis(recording)
+    frequencies, amplitudes, resolution = spectrum(recording.values, scale)
     largest = found.amplitudes[0]
 
     def decibels(amplitudes):
@@ -71,22 +93,12 @@ def plot(recording, found, analysis, path):
 
     lines = decibels(amplitudes)
     bottom = min(decibels(found.amplitudes).min(), np.median(lines)) - 25
-    drawing.trace(axes, scale * frequencies, lines, color=drawing.GREY, linewidth=0.6)
     seen = np.nan_to_num(analysis.amplitudes) > largest * 10**(bottom / 20)
-    axes.plot(found.frequencies, decibels(found.amplitudes), "o", color=drawing.BLUE, markersize=5,
-              label="tones")
-    axes.plot(analysis.frequencies[seen], decibels(analysis.amplitudes[seen]), "x", color=drawing.WARM,
-              markersize=6, label="harmonics")
-    for h in np.flatnonzero(seen):
-        axes.annotate(str(h + 1), (analysis.frequencies[h], decibels(analysis.amplitudes[h])),
-                      xytext=(0, 6), textcoords="offset points", ha="center", fontsize=8)
-    axes.set(xlabel=label, ylabel="Amplitude (dB of the largest tone)",
-             title=f"Tones of {recording.name}: SINAD {analysis.sinad:.1f} dB, {analysis.enob:.2f} bits")
-    axes.set_ylim(bottom, 15)
-    axes.margins(x=0.005)
-    axes.legend(frameon=False)
-    os.makedirs(os.path.dirname(path) or ".", exist_ok=True)
-    marked = {"metadata": {"Creator": outputs.mark("tones")}} if path.lower().endswith(".svg") else {}
-    with outputs.whole(path) as part:
-        figure.savefig(part, **marked)
-    plt.close(figure)
+    marks = [figures.Mark(f, level, "", figures.BLUE) for f, level in zip(found.frequencies,
+                                                                         decibels(found.amplitudes))]
+    marks += [figures.Mark(analysis.frequencies[h], decibels(analysis.amplitudes[h]), str(h + 1))
+              for h in np.flatnonzero(seen)]
+    return figures.Plot(
+        f"Tones of {recording.name}: SINAD {analysis.sinad:.1f} dB, {analysis.enob:.2f} bits; harmonics by number",
+        frequency_axis(recording, resolution)[1], "Amplitude (dB of the largest tone)",
+        [figures.Curve("spectrum", lines, figures.GREY)], step=frequencies[1], marks=marks, y_range=(bottom, 15))

@@ -14,6 +14,9 @@ sys.path.insert(0, str(Path(__file__).resolve().parent.parent))
 from qx import __main__ as command  # noqa: E402
 from qx import fitting  # noqa: E402
 
+VALUES = {"line": lambda x, a, b: a * x + b, "exponential": lambda x, a, b, c: a * np.exp(b * x) + c,
+          "power": lambda x, a, b, c: a * x**b + c, "logarithm": lambda x, a, b: a * np.log(b * x),
+          "gaussian": lambda x, a, m, s, c: a * np.exp(-0.5 * ((x - m) / s)**2) + c}
 TRUTH = {"line": [0.7, 2.0], "exponential": [3.0, -0.8, 1.0], "power": [2.0, 1.3, 1.0],
          "logarithm": [2.5, 1.5], "gaussian": [4.0, 2.5, 0.6, 1.0]}
 
@@ -46,10 +49,10 @@ class Fitting(unittest.TestCase):
     def test_every_model_gives_back_what_the_data_are_made_of(self):
         for name, truth in TRUTH.items():
             with self.subTest(name):
-                self.write(self.x, fitting.MODELS[name].value(self.x, truth))
+                self.write(self.x, VALUES[name](self.x, *truth))
                 found, text = self.parameters("--model", name)
                 np.testing.assert_allclose(found, truth, rtol=1e-6)
-                self.assertIn("force (N) = " + fitting.MODELS[name].formula, text)
+                self.assertIn("force (N) = " + fitting.FORMULAS[name][0], text)
                 self.assertIn("x = time (s)", text)
                 self.assertIn("R^2 1\n", text)
         self.write(self.x, 1 - 2 * self.x + 0.25 * self.x**3)
@@ -68,8 +71,26 @@ class Fitting(unittest.TestCase):
         self.assertIn(f"standard deviation of the residuals {np.sqrt(sum(rest**2) / 78):.6g},", text)
         self.assertIn(f"mean absolute residual {np.mean(abs(rest)):.6g}, ", text)
 
+    def test_errors_are_those_of_the_estimate_and_doubts_are_told(self):
+        rng, found = np.random.default_rng(5), []
+        for _ in range(200):
+            columns = fitting.Columns(self.x, 3 * self.x - 1 + 0.5 * rng.normal(size=80), np.empty(0), "x", "y")
+            found.append(fitting.fit("line", columns).fit.parameters["a"])
+        self.write(self.x, 3 * self.x - 1 + 0.5 * rng.normal(size=80))
+        _, text = self.parameters("--model", "line")
+        error = float(text.split("±")[1].split()[0])
+        self.assertLess(abs(error / np.std(found) - 1), 0.25)
+        self.assertNotIn("Warning", text)
+        self.write(self.x, np.exp(-self.x) + 0.001 * rng.normal(size=80))
+        _, text = self.parameters("--model", "gaussian")
+        self.assertRegex(text, "Warning: (m is outside the data|a is )")
+        self.write(self.x, rng.normal(size=80))
+        self.assertRegex(self.parameters("--model", "exponential")[1], "Warning: .*(standard error|only together|data)")
+        self.write([0, 1.0], [1, 3.0])
+        self.assertIn("no more samples than parameters", self.parameters("--model", "line")[1])
+
     def test_the_plot_goes_where_it_is_wanted(self):
-        self.write(self.x, fitting.MODELS["gaussian"].value(self.x, TRUTH["gaussian"]))
+        self.write(self.x, VALUES["gaussian"](self.x, *TRUTH["gaussian"]))
         for name, start in (("new/fit.svg", b"<?xml"), ("fit.png", b"\x89PNG")):
             path = self.folder / name
             code, text = self.run_command("--model", "gaussian", "--plot", path, plots=True)
@@ -81,7 +102,7 @@ class Fitting(unittest.TestCase):
         self.assertIn("abc", text.splitlines()[-1])
 
     def test_bounds_and_methods(self):
-        y = fitting.MODELS["exponential"].value(self.x, TRUTH["exponential"])
+        y = VALUES["exponential"](self.x, *TRUTH["exponential"])
         self.write(self.x, y)
         found, _ = self.parameters("--model", "exponential", "--fix", "c=0", "--lower", "b=-0.5",
                                    "--guess", "a=2", "--guess", "b=-0.1", "--guess", "c=0")

@@ -114,6 +114,17 @@ class Events(unittest.TestCase):
 
 
 class Pulses(unittest.TestCase):
+    def test_levels_are_means_of_the_states_and_no_centres_of_bins(self):
+        rng = np.random.default_rng(1)
+        gate = np.where(np.arange(1000) % 500 < 250, -0.3711, 1.2347)
+        np.testing.assert_allclose(measuring.levels(gate), [(1.2347, 0), (-0.3711, 0)], rtol=1e-15, atol=1e-15)
+        found = np.array([measuring.levels(gate + 0.02 * rng.normal(size=1000)) for _ in range(100)])
+        np.testing.assert_allclose(found[:, :, 0].mean(0), [1.2347, -0.3711], atol=5e-4)
+        np.testing.assert_allclose(found[:, :, 1].mean(0), found[:, :, 0].std(0), rtol=0.5)
+        noisy = gate + 0.02 * rng.normal(size=1000)
+        one = measuring.pulse(np.r_[np.full(50, -0.3711), noisy[250:], np.full(50, -0.3711)])
+        self.assertAlmostEqual(one.high, 1.2347, delta=5 * one.high_error)
+
     def test_trapezoids(self):
         shape = np.r_[np.zeros(30), np.linspace(0, 1, 11), np.ones(40), np.linspace(1, 0, 6), np.zeros(13)]
         x = np.tile(shape, 5) * 2 + 1

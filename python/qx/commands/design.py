@@ -22,23 +22,17 @@ the edges of pass and stop bands, twice as many, in ascending order."""
 
 
 def made(options):
-    """The Filter, and what of it a program reads."""
+    """The Design that the options ask for."""
     from .. import design
     kind, edges, rate = options.type, options.edges, options.rate
     if options.family in design.FAMILIES:
-        form = design.FOURTH_ORDER if options.fourth else design.SECOND_ORDER
-        a, b, filter_ = design.iir(options.family, kind, edges, rate, options.order, options.ripple,
-                                   options.attenuation, form)
-        return filter_, {"form": form, "a": list(a), "b": list(b)}
+        return design.iir(options.family, kind, edges, rate, options.order, options.ripple, options.attenuation,
+                          options.fourth)
     if options.family == "windowed":
-        filter_ = design.windowed(kind, edges, rate, options.taps, options.window)
-    elif options.family == "equiripple":
-        filter_ = design.equiripple(kind, edges, rate, options.taps, options.weight)
-    else:
-        stages, filter_ = design.narrow(kind, edges, rate, options.ripple, options.attenuation)
-        return filter_, {name: list(value) if name in ("model", "interpolator") else value
-                         for name, value in stages.items()}
-    return filter_, {"taps": list(filter_.sections[0][0])}
+        return design.windowed(kind, edges, rate, options.taps, options.window)
+    if options.family == "equiripple":
+        return design.equiripple(kind, edges, rate, options.taps, options.weight)
+    return design.narrow(kind, edges, rate, options.ripple, options.attenuation)
 
 
 def design_filter(options):
@@ -48,16 +42,16 @@ def design_filter(options):
     for path in (page, numbers):
         outputs.check(path, options.force, "design")
     design.check_edges(options.type, options.edges, options.rate)
-    filter_, coefficients = made(options)
+    done = made(options)
     title = f"{options.family.capitalize().replace('-', ' ')} {options.type}"
     edges = ", ".join(f"{edge:g}" for edge in options.edges)
-    for line in design_page.write(filter_, f"{title}, {edges} of {options.rate:g}", options.rate, page):
+    for line in design_page.write(done, f"{title}, {edges} of {options.rate:g}", options.rate, page):
         print(line)
     outputs.write_text(numbers, json.dumps(
         {"generator": outputs.mark("design"), "family": options.family, "type": options.type,
-         "rate": options.rate, "edges": options.edges, "export": filter_.export, **coefficients},
+         "rate": options.rate, "edges": options.edges, "python": done.python, **done.numbers},
         indent=1) + "\n")
-    print(f"\nMagnitude, phase and group delay: {page}\nCoefficients: {numbers}")
+    print(f"\nResponses, poles, zeros and coefficients: {page}\nCoefficients: {numbers}")
 
 
 def add(commands):

@@ -33,13 +33,13 @@ def fit(options):
     from .. import fitting, outputs
     path = options.plot or os.path.join("out", "fit.svg")
     outputs.check(path, options.force, "fit", outputs.identities([options.file]))
-    model = fitting.model_of(options.model, options.order)
+    fitting.parameters_of(options.model, options.order)
     fixed = values(options.fix)
     told = fitting.Options(METHODS.index(options.method), values(options.guess),
                            {**values(options.lower), **fixed}, {**values(options.upper), **fixed})
     columns = fitting.read(options.file, options.x, options.y, options.weights, options.decimal,
                            options.missing, options.time, options.dates, options.thousands)
-    result = fitting.fit(model, columns, told)
+    result = fitting.fit(options.model, columns, told, options.order)
     for line in fitting.lines(result):
         print(line)
     fitting.plot(result, path)

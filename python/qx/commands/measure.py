@@ -49,7 +49,11 @@ def write_table(path, names, rows):
 
 
 def show_table(names, rows):
-    cells = [names, *([f"{value:.6g}" for value in row] for row in rows[:SHOWN])]
+    show_texts(names, [[f"{value:.6g}" for value in row] for row in rows])
+
+
+def show_texts(names, rows):
+    cells = [names, *rows[:SHOWN]]
     widths = [max(map(len, column)) for column in zip(*cells)]
     for row in cells:
         print("  ".join(cell.rjust(width) for cell, width in zip(row, widths)))
@@ -99,8 +103,8 @@ def peaks(options):
         kind = "valley" if options.valleys else "peak"
         print(f"{read.name}: {len(rows)} {kind}{'s' * (len(rows) != 1)} {' and '.join(said)}".rstrip())
     if len(places) > 1:
-        from ..calls import call
-        interval = call("Median_head", places[1:] - places[:-1]) * step
+        from .. import stats
+        interval = stats.median(places[1:] - places[:-1]) * step
         print(f"median interval {interval:.6g} {read.time_unit}"
               + (f", {60 / interval:.4g} per minute" if read.rate else ""))
     tell(options, names, rows)
@@ -119,6 +123,7 @@ def event_pulses(read):
 
 def pulse(options):
     from .. import measuring
+    from ..sections import uncertain
     from ..tables import InputError
     read, step = opened(options)
     direction = measuring.FALLING if options.falling else measuring.RISING
@@ -137,8 +142,11 @@ def pulse(options):
             "" if options.events else f" that begins with a {kind} edge"))
     unit, time = read.unit or "", read.time_unit
     print(f"{read.name}: pulse {options.number}" + (f" of {len(found)}" if found else ""))
+    for label, level, error in (("low level", one.low, one.low_error), ("high level", one.high, one.high_error)):
+        text, error = uncertain(level, error)
+        print(f"  {label:<24} {text:>12} {'± ' + error + ' ' if error else ''}{unit}".rstrip())
     for label, value, its_unit in (
-            ("low level", one.low, unit), ("high level", one.high, unit), ("start", one.start * step, time),
+            ("start", one.start * step, time),
             ("end", one.end * step, time), ("width at half height", one.width * step, time),
             ("first edge, 10% to 90%", one.first_duration * step, time),
             ("second edge, 90% to 10%", one.second_duration * step, time),

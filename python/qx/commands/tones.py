@@ -4,7 +4,7 @@ import os
 
 from ..outputs import add_force
 from . import reading
-from .measure import number, show_table, write_table
+from .measure import number, show_table, show_texts, write_table
 from .values import add_command, positive
 
 EXAMPLES = """\
@@ -19,8 +19,9 @@ IEEE 1241. A drawing of an earlier run (SVG) is replaced; other files of that na
 
 
 def tones(options):
-    from .. import outputs, recording
+    from .. import drawing, measure, outputs, recording
     from .. import tones as topic
+    from ..sections import uncertain
     path = options.plot or os.path.join("out", "tones.svg")
     inputs = outputs.identities([options.file])
     outputs.check(path, options.force, "tones", inputs)
@@ -30,16 +31,20 @@ def tones(options):
     print(f"{read.name}: {read.choice}")
     rate = read.rate or 1.0
     found = topic.tones(read.values, rate, options.count)
-    analysis = topic.harmonics(read.values, rate, options.harmonics, options.fundamental or 0.0,
-                               options.full_scale or 0.0)
+    analysis = measure.harmonics(read.values, rate, options.fundamental, options.harmonics, options.full_scale)
 
     frequency = "frequency (Hz)" if read.rate else "frequency (1/sample)"
     amplitude = f"amplitude ({read.unit})" if read.unit else "amplitude"
     names = [frequency, amplitude, "phase (rad)"]
     many = len(found.frequencies)
     print(f"{many} tone{'s' * (many != 1)}, which leave {found.residual_rms:.6g} {read.unit}".rstrip()
-          + " (root mean square)")
-    show_table(names, list(zip(found.frequencies, found.amplitudes, found.phases)))
+          + f" (root mean square); resolution {found.resolution:.4g}{' Hz' * bool(read.rate)}")
+    columns = list(zip(found.frequencies, found.frequency_errors, found.amplitudes, found.amplitude_errors,
+                       found.phases))
+    show_texts([names[0], "±", names[1], "±", names[2]],
+               [(*uncertain(*row[:2]), *uncertain(*row[2:4]), f"{row[4]:.6g}") for row in columns])
+    if not found.stands.all():
+        print("Could be noise: " + ", ".join(f"{f:.6g}" for f in found.frequencies[~found.stands]))
     print("Harmonics")
     rows = [(h, *row) for h, row in enumerate(zip(analysis.frequencies, analysis.amplitudes,
                                                   analysis.phases), 1)]
@@ -50,11 +55,11 @@ def tones(options):
                                ("noise in a bin", analysis.noise_floor, "dB of the fundamental")):
         print(f"  {label:<16} {value:>10.6g} {unit}")
     if options.csv:
-        write_table(options.csv, ["kind", "number", *names],
-                    [("tone", i, *row) for i, row in enumerate(
-                        zip(found.frequencies, found.amplitudes, found.phases), 1)]
-                    + [("harmonic", *row) for row in rows])
-    topic.plot(read, found, analysis, path)
+        errors = [f"standard error of {name}" for name in names[:2]]
+        write_table(options.csv, ["kind", "number", names[0], names[1], names[2], *errors],
+                    [("tone", i, row[0], row[2], row[4], row[1], row[3]) for i, row in enumerate(columns, 1)]
+                    + [("harmonic", *row, "", "") for row in rows])
+    drawing.save([topic.plot(read, found, analysis)], path, "tones")
     print(f"Spectrum with tones and harmonics: {path}")
 
 

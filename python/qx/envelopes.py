@@ -1,0 +1,43 @@
+"""The outline of a signal of any length: the lowest and the highest value of blocks that grow with it."""
+
+import numpy as np
+
+from .figures import extremes
+
+
+class Envelope:
+    """Takes a signal part by part and keeps no more than `most` blocks; as long as it is shorter, its
+    samples. `samples` of them are in a block."""
+
+    def __init__(self, most=1 << 16):
+        self.most, self.samples, self.count = most, 1, 0
+        self._lows, self._highs, self._blocks = np.empty(most), np.empty(most), 0
+        self._rest = np.empty(0)  # of the block that is not full
+
+    def add(self, values):
+        self.count += len(values)
+        values = np.concatenate([self._rest, values])
+        while len(values) >= self.samples:
+            room = (self.most - self._blocks) * self.samples
+            if not room:
+                self._halve()
+                continue
+            part = values[:min(room, len(values) // self.samples * self.samples)]
+            lows, highs = extremes(part, self.samples)
+            self._lows[self._blocks:self._blocks + len(lows)] = lows
+            self._highs[self._blocks:self._blocks + len(lows)] = highs
+            self._blocks += len(lows)
+            values = values[len(part):]
+        self._rest = values.copy()
+
+    def _halve(self):
+        half = self._blocks // 2
+        self._lows[:half], self._highs[:half] = extremes(self._lows[:self._blocks], 2, self._highs[:self._blocks])
+        self._blocks, self.samples = half, 2 * self.samples
+
+    def bounds(self):
+        """The lowest and the highest values of the blocks, the last one perhaps shorter."""
+        lows, highs = self._lows[:self._blocks], self._highs[:self._blocks]
+        if len(self._rest):
+            lows, highs = np.append(lows, np.fmin.reduce(self._rest)), np.append(highs, np.fmax.reduce(self._rest))
+        return lows, highs
