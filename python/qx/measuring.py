@@ -194,23 +194,27 @@ class Pulse:
 HISTOGRAM = {"method": AUTOMATIC, "bins": BINS}
 
 
-NEAR = 1.5  # bins around a level whose samples are its state
+NEAR = 1.5  # bins around a level that its state has at least
+GAIN = 1.1  # of samples, which another doubling of that range must bring
 ROUNDS = 50
 
 
-def state_level(values, level, width):
-    """The mean of the samples within NEAR bins of a level, about which they are taken anew until they
-    stay, and its standard uncertainty from their scatter."""
-    near = values[np.abs(values - level) <= NEAR * width]
+def state_level(values, level, width, most):
+    """The mean of the samples of the state about a level, and its standard uncertainty from their scatter.
+    The state reaches as far as samples are dense, up to `most`; it is taken anew about the mean until it
+    stays."""
+    away, half = np.abs(values - level), NEAR * width
+    while 2 * half < most and np.count_nonzero(away <= 2 * half) > GAIN * np.count_nonzero(away <= half):
+        half *= 2
+    near = values[away <= half]
     for _ in range(ROUNDS):
-        if not len(near):
-            return level, width / 12**0.5
-        mean = near.mean()
-        again = values[np.abs(values - mean) <= NEAR * width]
+        again = values[np.abs(values - near.mean()) <= half] if len(near) else near
         if len(again) == len(near):
             break
         near = again
-    return float(mean), float(near.std(ddof=1) / len(near)**0.5) if len(near) > 1 else width / 12**0.5
+    if len(near) < 2:
+        return level, width / 12**0.5
+    return float(near.mean()), float(near.std(ddof=1) / len(near)**0.5)
 
 
 def levels(values, method=AUTOMATIC, bins=BINS):
@@ -222,7 +226,8 @@ def levels(values, method=AUTOMATIC, bins=BINS):
     width = (greatest - least) / bins
     if high == greatest and low == least or not width > 0:
         return (high, 0.0), (low, 0.0)
-    found = state_level(values, high, width), state_level(values, low, width)
+    most = (high - low) / 4
+    found = state_level(values, high, width, most), state_level(values, low, width, most)
     return found if found[0][0] > found[1][0] else ((high, width / 12**0.5), (low, width / 12**0.5))
 
 

@@ -121,5 +121,3 @@ def histogram(recording):
     bars = [f"{label:>{wide}} {recording.unit}  {'#' * round(40 * count / longest):<40} {count}"
             for label, count in zip(labels, coarse)]
     return Section("Histogram", source, figures=[plot], terminal=["Histogram (bin centre, samples)", *bars])
-
-

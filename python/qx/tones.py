@@ -94,8 +94,7 @@ def plot(recording, found, analysis):
     lines = decibels(amplitudes)
     bottom = min(decibels(found.amplitudes).min(), np.median(lines)) - 25
     seen = np.nan_to_num(analysis.amplitudes) > largest * 10**(bottom / 20)
-    marks = [figures.Mark(f, level, "", figures.BLUE) for f, level in zip(found.frequencies,
-                                                                         decibels(found.amplitudes))]
+    marks = [figures.Mark(f, decibels(a), "", figures.BLUE) for f, a in zip(found.frequencies, found.amplitudes)]
     marks += [figures.Mark(analysis.frequencies[h], decibels(analysis.amplitudes[h]), str(h + 1))
               for h in np.flatnonzero(seen)]
     return figures.Plot(
