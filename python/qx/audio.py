@@ -6,7 +6,6 @@ import struct
 
 import numpy as np
 
-from .envelopes import Envelope
 from .files import InputError
 
 STARTS = (b"RIFF", b"RIFX", b"RF64", b"FORM", b"fLaC", b"OggS", b".snd", b"caff", b"riff")
@@ -19,10 +18,10 @@ def is_audio(path, start):
     return b"\0" in start and (start[:4] in STARTS or os.path.splitext(path)[1].lower() in ENDINGS)
 
 
-def read(path, local, column, first, most, whole, outlines):
+def read(path, local, column, first, most, whole, outlines, outline):
     """Samples of one channel from a frame on, the rate, the channel from 1 and the numbers of
-    channels and frames. Where these are more than are kept, `whole` is given all of them; `outlines` is
-    given the Envelopes of the other channels by their indices. `path` is what messages name, `local` the
+    channels and frames. `whole` is given all of them; `outlines` those of the
+    other channels by their indices, in what `outline` makes. `path` is what messages name, `local` the
     file."""
     import soundfile
     try:
@@ -33,7 +32,7 @@ def read(path, local, column, first, most, whole, outlines):
             channel = int(column or 1)
             if frames and not 0 <= first < frames:
                 raise InputError(f"{path}: has {frames} samples, none at {first}")
-            values, frames = _channel(path, file, channel, first, most, whole, outlines)
+            values, frames = _channel(path, file, channel, first, most, whole, outlines, outline)
             rate = float(file.samplerate)
     except soundfile.LibsndfileError as error:
         reason = error.error_string.strip().rstrip(".")
@@ -44,9 +43,9 @@ def read(path, local, column, first, most, whole, outlines):
     return values, rate, channel, channels, frames
 
 
-def _channel(path, file, channel, first, most, whole, outlines):
+def _channel(path, file, channel, first, most, whole, outlines, outline):
     kept, seen = [], 0
-    outlines.update({i: Envelope() for i in range(file.channels) if i != channel - 1})
+    outlines.update({i: outline() for i in range(file.channels) if i != channel - 1})
     while len(parts := file.read(FRAMES_AT_ONCE // file.channels + 1, dtype="float64", always_2d=True)):
         part = parts[:, channel - 1]
         wrong = np.flatnonzero(~np.isfinite(part))
@@ -54,11 +53,10 @@ def _channel(path, file, channel, first, most, whole, outlines):
             raise InputError(f"{path}: sample {seen + wrong[0] + 1} is not a finite number")
         begin, end = max(0, first - seen), max(0, first + most - seen)
         kept.append(part[begin:max(begin, end)].copy())
-        if file.frames > most:
-            whole.add(np.ascontiguousarray(part))
-        for i, outline in outlines.items():
+        whole.add(np.ascontiguousarray(part))
+        for i, one in outlines.items():
             beside = parts[begin:, i]
-            outline.add(np.where(np.isfinite(beside), beside, np.nan))
+            one.add(np.where(np.isfinite(beside), beside, np.nan))
         seen += len(part)
     return np.concatenate(kept) if kept else np.empty(0), seen
 

@@ -84,7 +84,7 @@ def reduced(plot, most=MOST_POINTS):
     return dataclasses.replace(plot, curves=curves, step=plot.step * group, x=x)
 
 
-def _numbers(values):
+def numbers(values):
     """An array as text, each number to seven digits of the largest distance from the middle."""
     values = np.asarray(values, float)
     finite = values[np.isfinite(values)]
@@ -119,8 +119,8 @@ def described(plot, most=MOST_POINTS):
                                                     "may_be_log", "y_range", "x_range", "levels",
                                                     "verticals")}
     found["marks"] = [dataclasses.asdict(mark) for mark in plot.marks]
-    found["curves"] = [{"name": curve.name, "colour": curve.colour, "dots": curve.dots, **_numbers(curve.values),
-                        "highs": None if curve.highs is None else _numbers(curve.highs)} for curve in plot.curves]
+    found["curves"] = [{"name": curve.name, "colour": curve.colour, "dots": curve.dots, **numbers(curve.values),
+                        "highs": None if curve.highs is None else numbers(curve.highs)} for curve in plot.curves]
     if plot.x is not None:
         found["x"] = [float(x) for x in plot.x]
     if plot.image:

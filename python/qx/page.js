@@ -125,6 +125,7 @@ class Figure {
 
   // New samples for the window, with a margin to either side that is there when it is moved.
   refresh() {
+    if (!this.graph) return;
     const [from, to] = this.window, margin = (to - from) / 2;
     const asked = this.asked = {};
     this.source.rows([from - margin, to + margin], 2 * this.points(), rows => {
@@ -267,11 +268,11 @@ function bars(event) {
   }
 }
 
-function drawAll(plots, sourceOf = plot => new Inside(plot)) {
-  figures.length = 0;
-  for (const element of document.querySelectorAll("figure.plot")) {
-    const plot = plots[Number(element.dataset.plot)];
-    figures.push(new Figure(element, plot, sourceOf(plot)));
+function drawAll(plots, root = document, sourceOf = plot => new Inside(plot)) {
+  for (let i = figures.length; i--;) if (!figures[i].element.isConnected) figures.splice(i, 1);
+  for (const element of root.querySelectorAll("figure.plot")) {
+    const i = Number(element.dataset.plot);
+    figures.push(new Figure(element, plots[i], sourceOf(plots[i], i)));
   }
 }
 

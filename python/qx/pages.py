@@ -50,8 +50,8 @@ def plots_of(sections):
     return [figure for section in sections for figure in section.figures if isinstance(figure, figures.Plot)]
 
 
-def body(sections):
-    """The sections with their plots, and what the page needs to draw them."""
+def parts(sections):
+    """The sections as HTML, and the plots in them as pages take them; none where they are drawn here."""
     curves = sum(len(plot.curves) for plot in plots_of(sections))
     most = max(1 << 9, min(figures.MOST_POINTS, POINTS // max(1, curves)))
     text, described = [], []
@@ -67,10 +67,16 @@ def body(sections):
             else:
                 text.append(figure)
         text.append("</section>")
-    if described:
-        text.append(f'<script type="application/json" id="plots">{data(described)}</script>')
-        text.append("<noscript><p>The plots are drawn by the browser, whose scripts are switched off.</p></noscript>")
-    return "\n".join(text)
+    return "\n".join(text), described
+
+
+def body(sections):
+    """The sections with their plots, and what the page needs to draw them."""
+    text, described = parts(sections)
+    if not described:
+        return text
+    return (f'{text}\n<script type="application/json" id="plots">{data(described)}</script>'
+            "<noscript><p>The plots are drawn by the browser, whose scripts are switched off.</p></noscript>")
 
 
 def table(rows):
@@ -88,19 +94,20 @@ def own_script(name):
     return script((HERE / name).read_text("utf-8"))
 
 
-def page(command, title, inner, sections=None, scripts=""):
-    """A whole page; `inner` is HTML below the title, before the sections; `scripts` are elements for its end."""
-    parts = dygraphs()
+def page(command, title, inner, sections=None, scripts="", moving=False):
+    """A whole page; `inner` is HTML below the title, before the sections; `scripts` are elements for its end, which
+    have plots of their own where it is `moving`."""
+    library = dygraphs()
     made = datetime.now(timezone.utc).strftime("%Y-%m-%d %H:%M UTC")
     drawn = body(sections) if sections is not None else ""
-    moves = "data-plot=" in drawn
+    moves = bool(library) and (moving or "data-plot=" in drawn)
     if not moves and sections is not None and plots_of(sections):
         inner += f"<p class=\"quiet\">{html.escape(STILL)}</p>"
     return (f'<!DOCTYPE html>\n<html lang="en"><head>{HEAD}{outputs.generator(command)}'
-            f"<title>{html.escape(title)}</title><style>{parts[1] if moves else ''}{style()}</style></head><body>\n"
+            f"<title>{html.escape(title)}</title><style>{library[1] if moves else ''}{style()}</style></head><body>\n"
             f"<h1>{html.escape(title)}</h1>\n{inner}\n{drawn}\n"
             f"<footer>Made {made} by python3 -m qx {command}.</footer>"
-            f"{script(parts[0]) + own_script('page.js') if moves else ''}{scripts}</body></html>\n")
+            f"{script(library[0]) + own_script('page.js') if moves else ''}{scripts}</body></html>\n")
 
 
 def thumbnail(curve):

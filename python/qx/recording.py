@@ -33,7 +33,7 @@ class Recording:
     notes: list  # comment lines of the file
     choice: str = ""  # what was taken from the file, and why
     whole: object = None  # figures of the whole file (Whole) where the values are a part of it
-    envelope: object = None  # the outline of the whole file (Envelope) where the values are a part of it
+    envelope: object = None  # the outline of the whole file (Envelope), where it was not read from a later sample
     others: list = dataclasses.field(default_factory=list)  # the other channels (Channel)
 
     def times(self):
@@ -58,20 +58,21 @@ class Channel:
 
 
 def read(path, rate=None, column=None, decimal=None, missing=None, start=0, time=None, dates=None,
-         thousands=False):
+         thousands=False, outline=Envelope):
     """Reads a text table, a sheet, arrays or an audio file; "-" is standard input. `rate` overrides what the
     file says, whose times are not read then; `column` and `time` are names or numbers from 1, `time` "none"
     where no column is time; `decimal` is "point" or "comma"; `thousands` says that a single mark before three
     digits groups thousands; `dates` is "dmy" or "mdy" for dates that may be either; `missing` values are
-    refused, or "skip" or "interpolate"; `start` samples are left out."""
+    refused, or "skip" or "interpolate"; `start` samples are left out. `outline` makes what the
+    values of each channel are added to: the `envelope` of the recording and of the other channels."""
     with opened(path) as source:
         if audio.is_audio(source.name, source.head):
-            recording = _of_audio(source, column, start)
+            recording = _of_audio(source, column, start, outline)
         else:
             options = {"decimal": decimal, "missing": missing, "dates": dates, "thousands": thousands}
             reader = table_of(source, time, options, column)
             habit = rates.Habit(reader.layout.shown, {"comma": ",", "point": "."}.get(decimal, ""), thousands)
-            recording = _of_table(reader, column, time, missing, start, rate, habit)
+            recording = _of_table(reader, column, time, missing, start, rate, habit, outline)
     lowest, highest = float(recording.values.min()), float(recording.values.max())
     if highest - lowest > WIDEST:
         raise InputError(f"{source.path}: from {lowest:g} to {highest:g} is more than a plot can span")
@@ -113,12 +114,12 @@ def table_of(source, time, options, *wanted):
     return reader
 
 
-def _of_audio(source, column, start):
-    whole = Whole(MOST_SAMPLES)
+def _of_audio(source, column, start, outline):
+    whole = Whole(MOST_SAMPLES, outline)
     path = source.local()
     outlines = {}
     values, rate, channel, channels, frames = audio.read(source.path, path, column, start, MOST_SAMPLES, whole,
-                                                         outlines)
+                                                         outlines, outline)
     shown = [Channel(f"channel {i + 1} of {channels}", "FS", outlines[i]) for i in sorted(outlines)[:MOST_CHANNELS]]
     others = f"; others: {_listed(f'channel {i + 1}' for i in range(channels) if i + 1 != channel)}"
     choice = f"channel {channel} of {channels}; {{rate}}{others * (channels > 1)}"
@@ -130,9 +131,9 @@ def _of_audio(source, column, start):
 
 
 def _if_longer(whole, start):
-    """The figures and the outline of all samples where the values are a part of them."""
+    """The figures of all samples where the values are a part of them, and their outline."""
     is_longer = whole.count > MOST_SAMPLES
-    return whole if is_longer else None, whole.envelope if is_longer and not start else None
+    return whole if is_longer else None, None if start else whole.envelope
 
 
 def _listed(names, most=12):
@@ -148,15 +149,16 @@ def _part(start, count, all_of_them):
     return f"; without the first {start} samples" if start else ""
 
 
-def _of_table(reader, column, time, missing, start, rate, habit):
+def _of_table(reader, column, time, missing, start, rate, habit, outline):
     path, layout = reader.path, reader.layout
     _refuse_wrapped(reader, column)
     clocks, indices = _roles(reader, time)
     chosen = _column(reader, clocks, indices, column)
     time = None if rate else _time_column(reader, [c for c in clocks if c != chosen])
     others = [c for c in _numeric(reader) if c not in (chosen, time, *clocks, *indices)][:MOST_CHANNELS]
-    outlines = {c: Envelope() for c in others}
-    values, seconds, whole, said = _columns(reader, chosen, time, start, outlines)
+    outlines = {c: outline() for c in others}
+    whole = Whole(MOST_SAMPLES, outline)
+    values, seconds, said = _columns(reader, chosen, time, start, outlines, whole)
     if not len(values):
         raise InputError(f"{path}: has no value from sample {start + 1} on")
     holes = np.isnan(values)
@@ -285,12 +287,12 @@ def _date_beside(reader, time):
                  and not reader.is_of_day(c) and not any(":" in cell for cell in reader.layout.sample(c))), None)
 
 
-def _columns(reader, chosen, time, start, outlines):
+def _columns(reader, chosen, time, start, outlines, whole):
     """The values and the times, or None, from a sample on, the figures of all, and what is to be said of them.
     `outlines` has the Envelopes of other columns, which are filled; a column that cannot be read goes."""
     date = _date_beside(reader, time)
     columns = [c for c in dict.fromkeys((chosen, time, date)) if c is not None]
-    kept, seen, whole = {c: [] for c in columns}, 0, Whole(MOST_SAMPLES)
+    kept, seen = {c: [] for c in columns}, 0
     for part, _ in reader.parts(columns, outlines):
         first, last = max(0, start - seen), max(0, start + MOST_SAMPLES - seen)
         seen += len(part[chosen])
@@ -311,7 +313,7 @@ def _columns(reader, chosen, time, start, outlines):
         seconds, nights = times.over_midnight(seconds)
         if nights:
             said = [f"the times go over midnight {nights} time{'s' * (nights > 1)}"]
-    return joined[chosen], seconds, whole, said
+    return joined[chosen], seconds, said
 
 
 def _without_holes(path, values, seconds, holes, missing):

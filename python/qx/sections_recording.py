@@ -26,7 +26,7 @@ def outline(recording, title, channel=None):
     channel = channel or recording
     plot = over_time(recording, title)
     plot.y_label = quantity(channel)
-    if channel.envelope is None:
+    if channel.envelope is None or channel is recording and not recording.whole:
         plot.curves = [figures.Curve(channel.channel, channel.values)]
         return plot
     lows, highs = channel.envelope.bounds()

@@ -79,9 +79,9 @@ class Whole:
     """Figures of all samples of a file. Of one that is not longer than `kept` samples only the outline
     is made: the other sections have the samples."""
 
-    def __init__(self, kept):
+    def __init__(self, kept, outline=Envelope):
         self.kept, self.count, self.total, self.squares = kept, 0, 0.0, 0.0
-        self.envelope, self.histogram, self.spectrum = Envelope(), Histogram(), AveragedSpectrum()
+        self.envelope, self.histogram, self.spectrum = outline(), Histogram(), AveragedSpectrum()
         self._waiting = []  # until there are more than are kept
 
     def add(self, values):

@@ -1,0 +1,76 @@
+// The page of `view`: samples come from the server as they are needed, and the sections are made anew for
+// the part, the filter and the window that are chosen.
+"use strict";
+
+const form = document.querySelector("form.choices"), state = document.getElementById("state");
+const base = location.pathname.endsWith(`/${form.dataset.file}/`) ? "" : `${form.dataset.file}/`;
+
+async function ask(what, query, signal) {
+  const response = await fetch(`${base}${what}?${new URLSearchParams(query)}`, {signal});
+  const found = await response.json();
+  if (!response.ok) throw new Error(found.error);
+  return found;
+}
+
+function tell(text) {
+  state.textContent = text;
+}
+
+// The samples of a channel, of which the server has the levels of detail.
+class Remote {
+  constructor(plot, channel) {
+    Object.assign(this, {plot, channel, range: [0, Math.max(1, plot.count - 1) * plot.step]});
+  }
+  rows([from, to], most, then) {
+    this.pending?.abort();
+    this.pending = new AbortController();
+    ask("data", {channel: this.channel, from: Math.max(0, from), to: Math.max(0, to), points: Math.round(most),
+                 version: form.dataset.version}, this.pending.signal).then(found => {
+      const place = i => found.start + i * found.step;
+      const curve = {lows: numbers(found.lows), highs: found.highs && numbers(found.highs)};
+      then(reduce([curve], place, 0, curve.lows.length, Infinity));
+    }).catch(error => { if (error.name !== "AbortError") tell(error.message); });
+  }
+}
+
+const channelPlots = JSON.parse(document.getElementById("channel-plots").textContent);
+drawAll(channelPlots, document.getElementById("channels"), (plot, i) => new Remote(plot, i));
+
+let asked = 0, waiting;
+
+async function analyse() {
+  const mine = ++asked, query = Object.fromEntries([...new FormData(form)].filter(([, value]) => value !== ""));
+  try {
+    const found = await ask("sections", query);
+    if (mine !== asked) return;
+    const target = document.getElementById("sections");
+    target.innerHTML = found.html;
+    drawAll(found.plots, target);
+    tell("");
+  } catch (error) {
+    if (mine === asked) tell(error.message);
+  }
+}
+
+form.addEventListener("input", () => { clearTimeout(waiting); waiting = setTimeout(analyse, 300); });
+form.addEventListener("submit", event => event.preventDefault());
+document.getElementById("shown").addEventListener("click", () => {
+  const [from, to] = figures[0].window;
+  form.elements.from.value = Number(from.toPrecision(9));
+  form.elements.to.value = Number(to.toPrecision(9));
+  analyse();
+});
+
+setInterval(async () => {
+  try {
+    const found = await ask("state", {});
+    if (found.state === "gone") tell("The file is gone; this is what was read of it.");
+    else if (found.state === "changed" || String(found.version) !== form.dataset.version) {
+      tell("The file has changed: reload the page to read it anew.");
+    }
+  } catch (error) {
+    tell("The server does not answer: it may have been ended.");
+  }
+}, 1000);
+
+analyse();

@@ -1,0 +1,192 @@
+"""Recordings as `view` has them: all samples of all channels on the disk, with levels of detail, and the
+sections of a part of them, with the filter and the window that are chosen."""
+
+import contextlib
+import dataclasses
+import os
+import tempfile
+import threading
+
+import numpy as np
+
+from . import figures, pages, recording, sections_recording, sections_spectra
+from .files import InputError
+from .outcomes import QxError
+from .sections import Section, number
+from .sections_filtering import filtered
+from .sections_measuring import events
+
+BLOCK = 64  # samples, and blocks, in a block of the next level
+WINDOWS = ("hann", "hamming", "blackman", "blackman_harris", "flattop", "boxcar")
+KINDS = ("none", "lowpass", "highpass", "bandpass", "bandstop")
+MOST = 1 << 22  # samples of which sections are made
+
+
+class Levels:
+    """The samples of a channel in a file, and the lowest and highest of blocks. Filled part by part, as an
+    Envelope is."""
+
+    def __init__(self, folder):
+        number_, self._path = tempfile.mkstemp(dir=folder)
+        self._file = os.fdopen(number_, "wb")
+        self._parts, self._rest, self.count = [], np.empty(0), 0
+
+    def add(self, values):
+        values = np.ascontiguousarray(values, float)
+        values.tofile(self._file)
+        self.count += len(values)
+        values = np.concatenate([self._rest, values])
+        whole = len(values) // BLOCK * BLOCK
+        if whole:
+            self._parts.append(figures.extremes(values[:whole], BLOCK))
+        self._rest = values[whole:].copy()
+
+    def finish(self):
+        self._file.close()
+        if len(self._rest):
+            self._parts.append(figures.extremes(self._rest, BLOCK))
+        blocks = tuple(map(np.concatenate, zip(*self._parts)))
+        self._blocks = [(BLOCK, *blocks), (BLOCK**2, *figures.extremes(blocks[0], BLOCK, blocks[1]))]
+        self.values = np.memmap(self._path, float, "r", shape=(self.count,))
+        self._parts, self._rest = [], np.empty(0)
+
+    def seen(self, first, last, most):
+        """From `first` to `last`, in no more than about `most` groups: the first index, the samples in a
+        group, and the lowest and the highest values, or the samples and None."""
+        first, last = max(0, first), min(self.count, last)
+        group = max(1, -(-(last - first) // max(1, most)))
+        for samples, lows, highs in reversed(self._blocks):
+            if group >= samples:
+                part = slice(first // samples, -(-last // samples))
+                group //= samples
+                return (part.start * samples, group * samples,
+                        *figures.extremes(lows[part], group, highs[part])) if group > 1 else (
+                            part.start * samples, samples, lows[part], highs[part])
+        values = self.values[first:last]
+        return (first, 1, values, None) if group == 1 else (first, group, *figures.extremes(values, group))
+
+
+@dataclasses.dataclass
+class Choices:
+    """What of a recording is analysed, and how."""
+    channel: int = 0
+    start: float = 0.0  # in the unit of its times
+    end: float = float("inf")
+    window: str = "hann"
+    kind: str = "none"
+    edges: tuple = ()
+    order: int = 4
+
+
+class Opened:
+    """A recording that is shown; read anew when its file has changed."""
+
+    def __init__(self, path, options):
+        self.path, self.options = path, options
+        self.name = os.path.basename(path)
+        self._lock = threading.Lock()
+        self._folder = self._seen = None
+        self.version = 0
+        self.read()
+
+    def state(self):
+        """"same", "changed" or "gone", by the file as it is now."""
+        found = self._status()
+        return "same" if found == self._seen else "changed" if found else "gone"
+
+    def _status(self):
+        with contextlib.suppress(OSError):
+            status = os.stat(self.path)
+            return status.st_ino, status.st_size, status.st_mtime_ns
+        return None
+
+    def read(self):
+        """Reads the file where it is another than before; what was read stays where that fails."""
+        with self._lock:
+            status = self._status()
+            if status == self._seen and self.version:
+                return
+            folder = tempfile.TemporaryDirectory(prefix="qx_view_")
+            try:
+                self._take(recording.read(self.path, **self.options, outline=lambda: Levels(folder.name)), folder)
+            except BaseException:
+                folder.cleanup()
+                raise
+            self._folder, self._seen = folder, status  # the one before goes with the last who uses it
+            self.version += 1
+
+    def _take(self, read, folder):
+        main = read.envelope
+        if main is None or main.count != len(read.values) and not read.whole:
+            main = Levels(folder.name)  # missing values have been filled in
+            main.add(read.values)
+        channels = [(read.channel, read.unit, main)]
+        channels += [(other.channel, other.unit, other.envelope) for other in read.others]
+        for *_, levels in channels:
+            levels.finish()
+        self.recording, self.channels = dataclasses.replace(read, others=[], whole=None, envelope=None), channels
+
+    def plots(self):
+        """The plots of the channels, whose samples are asked for as they are needed."""
+        for name, unit, levels in self.channels:
+            shown = dataclasses.replace(self.recording, channel=name, unit=unit)
+            plot = figures.described(sections_recording.over_time(shown, name, curves=[
+                figures.Curve(name, np.empty(0))]))
+            yield {**plot, "count": levels.count}
+
+    def data(self, channel, start, end, points):
+        """A part of a channel as the page takes it."""
+        levels = self.channels[channel][2]
+        rate = self.recording.rate or 1.0
+        first, group, lows, highs = levels.seen(int(np.floor(start * rate)), int(np.ceil(end * rate)) + 1, points)
+        return {"start": first / rate, "step": group / rate, "lows": figures.numbers(lows),
+                "highs": None if highs is None else figures.numbers(highs)}
+
+    def sections(self, choices):
+        """The sections, and those of their plots that go over time where the part is."""
+        name, unit, levels = self.channels[choices.channel]
+        rate = self.recording.rate or 1.0
+        first = min(max(0, round(choices.start * rate)), levels.count - 1)
+        last = min(levels.count, round(min(choices.end, levels.count / rate) * rate) + 1)
+        if last <= first:
+            raise InputError("the part ends before it begins")
+        said = ""
+        if last - first > MOST:
+            last = first + MOST
+            said = f" The first {MOST} samples of the part."
+        values = np.array(levels.values[first:last])
+        values = values[np.isfinite(values)]
+        if len(values) < 2:
+            raise InputError("the part has fewer than two samples")
+        part = dataclasses.replace(self.recording, channel=name, unit=unit, values=values)
+        unit_ = part.time_unit
+        found = [Section("What is analysed", f"{name}: {len(values)} samples from {number(first / rate, 9)} to "
+                         f"{number((last - 1) / rate, 9)} {unit_}.{said}")]
+        if choices.kind != "none":
+            section, after = filtered(part, choices.kind, choices.edges, choices.order)
+            found.append(section)
+            part = dataclasses.replace(part, values=after)
+        for make in (sections_recording.statistics, sections_recording.histogram,
+                     lambda one: sections_spectra.amplitudes(one, choices.window),
+                     lambda one: sections_spectra.power(one, choices.window),
+                     lambda one: sections_spectra.over_time(one, choices.window), events):
+            try:
+                section = make(part)
+            except QxError as error:
+                section = Section("Not possible", f"{error}.")
+            if section:
+                found.append(section)
+        for plot in pages.plots_of(found):
+            if plot.link == sections_recording.TIME:
+                _move(plot, first / rate)
+        return found
+
+
+def _move(plot, by):
+    plot.start += by
+    plot.x_range = plot.x_range and (plot.x_range[0] + by, plot.x_range[1] + by)
+    for mark in plot.marks:
+        mark.x += by
+    if plot.image:
+        plot.image.left += by
+        plot.image.right += by
