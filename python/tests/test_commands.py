@@ -12,6 +12,7 @@ import tempfile
 import time
 import unittest
 from pathlib import Path
+from unittest import mock
 
 import numpy as np
 import soundfile
@@ -45,7 +46,13 @@ class InAFolder(unittest.TestCase):
         return code, out.buffer.getvalue().decode()
 
 
+async def served(opened, port, ready):
+    """In place of the server of `view`, which would go on."""
+    ready(f"http://127.0.0.1:{port}/")
+
+
 class Examples(InAFolder):
+    @mock.patch("qx.serving.serve", served)
     def test_every_help_has_examples_and_each_runs(self):
         for name, parser in {"": command.parser(), **commands()}.items():
             examples = [line.split("-m qx ", 1)[1] for line in parser.format_help().split("\n")
