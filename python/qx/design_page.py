@@ -11,6 +11,7 @@ from .sections import Row, Section, number, resolved
 POINTS = 4000
 FLOOR = -200.0  # dB
 AROUND = 4.0  # times the highest edge, up to which the axes go at first
+MOST_ZEROS = 300  # that are sought
 SHOWN = 40  # coefficients in the lines of C; more are left out
 
 
@@ -67,7 +68,7 @@ def described(design, rate):
     crossings = resolved(half_power(frequencies, gain), rate / 2 / POINTS)
     delays = delay[(np.abs(gain) > 0.5 ** 0.5 * np.abs(gain).max()) & np.isfinite(delay)]
     rows = [Row("Filter", size + (", " + design.note if design.note else ""), "", design.python),
-            Row("Stable", "yes" if filter_.is_stable else "NO", "", "Filter.poles"),
+            Row("Stable", "yes" if not filter_.is_iir or filter_.is_stable else "NO", "", "Filter.poles"),
             Row("Half power at", ", ".join(crossings) or "no frequency", unit, "Filter.response"),
             Row("Least gain", number(round(float(decibels.min()), 6), 4), "dB", "Filter.response"),
             Row("Greatest gain", number(round(float(decibels.max()), 6), 4), "dB", "Filter.response")]
@@ -82,8 +83,7 @@ def described(design, rate):
                         ("Group delay", f"Delay ({delay_unit})", delay, _delay_range(delay, gain))])),
             Section("Responses over time", "To a single 1, and to ones without end.", [],
                     _over_time(filter_, rate, factor, delay_unit)),
-            Section("Poles and zeros", "In the z plane, × poles and ○ zeros; the filter is stable with all poles "
-                    "inside the circle.", [], [plane(filter_.poles, filter_.zeros)]),
+            in_the_plane(filter_),
             Section("Coefficients", "Sections of second order, one to a row, as SciPy has them in sos."
                     if filter_.is_iir else "The taps, which are also the impulse response.", [],
                     [coefficients(filter_)]),
@@ -115,6 +115,14 @@ def _over_time(filter_, rate, factor, unit):
     step = filter_(np.ones(settled))
     return [figures.Plot(title, f"Time ({unit})", "Response", [figures.Curve("response", values)], step=factor,
                          link="time") for title, values in (("Impulse response", impulse), ("Step response", step))]
+
+
+def in_the_plane(filter_):
+    if not filter_.is_iir and len(filter_.taps) > MOST_ZEROS:
+        return Section("Poles and zeros", f"The {len(filter_.taps) - 1} zeros are not drawn; all poles are at 0.")
+    poles = filter_.poles if filter_.is_iir else np.zeros(1, complex)
+    return Section("Poles and zeros", "In the z plane, × poles and ○ zeros; the filter is stable with all poles "
+                   "inside the circle.", [], [plane(poles, filter_.zeros)])
 
 
 def plane(poles, zeros):

@@ -58,21 +58,22 @@ class Channel:
 
 
 def read(path, rate=None, column=None, decimal=None, missing=None, start=0, time=None, dates=None,
-         thousands=False, outline=Envelope):
+         thousands=False, outline=Envelope, progress=lambda samples: None):
     """Reads a text table, a sheet, arrays or an audio file; "-" is standard input. `rate` overrides what the
     file says, whose times are not read then; `column` and `time` are names or numbers from 1, `time` "none"
     where no column is time; `decimal` is "point" or "comma"; `thousands` says that a single mark before three
     digits groups thousands; `dates` is "dmy" or "mdy" for dates that may be either; `missing` values are
     refused, or "skip" or "interpolate"; `start` samples are left out. `outline` makes what the
-    values of each channel are added to: the `envelope` of the recording and of the other channels."""
+    values of each channel are added to: the `envelope` of the recording and of the other channels; `progress` is told of each part how
+    many samples it has."""
     with opened(path) as source:
         if audio.is_audio(source.name, source.head):
-            recording = _of_audio(source, column, start, outline)
+            recording = _of_audio(source, column, start, outline, progress)
         else:
             options = {"decimal": decimal, "missing": missing, "dates": dates, "thousands": thousands}
             reader = table_of(source, time, options, column)
             habit = rates.Habit(reader.layout.shown, {"comma": ",", "point": "."}.get(decimal, ""), thousands)
-            recording = _of_table(reader, column, time, missing, start, rate, habit, outline)
+            recording = _of_table(reader, column, time, missing, start, rate, habit, outline, progress)
     lowest, highest = float(recording.values.min()), float(recording.values.max())
     if highest - lowest > WIDEST:
         raise InputError(f"{source.path}: from {lowest:g} to {highest:g} is more than a plot can span")
@@ -114,8 +115,8 @@ def table_of(source, time, options, *wanted):
     return reader
 
 
-def _of_audio(source, column, start, outline):
-    whole = Whole(MOST_SAMPLES, outline)
+def _of_audio(source, column, start, outline, progress):
+    whole = Whole(MOST_SAMPLES, outline, progress)
     path = source.local()
     outlines = {}
     values, rate, channel, channels, frames = audio.read(source.path, path, column, start, MOST_SAMPLES, whole,
@@ -149,7 +150,7 @@ def _part(start, count, all_of_them):
     return f"; without the first {start} samples" if start else ""
 
 
-def _of_table(reader, column, time, missing, start, rate, habit, outline):
+def _of_table(reader, column, time, missing, start, rate, habit, outline, progress):
     path, layout = reader.path, reader.layout
     _refuse_wrapped(reader, column)
     clocks, indices = _roles(reader, time)
@@ -157,7 +158,7 @@ def _of_table(reader, column, time, missing, start, rate, habit, outline):
     time = None if rate else _time_column(reader, [c for c in clocks if c != chosen])
     others = [c for c in _numeric(reader) if c not in (chosen, time, *clocks, *indices)][:MOST_CHANNELS]
     outlines = {c: outline() for c in others}
-    whole = Whole(MOST_SAMPLES, outline)
+    whole = Whole(MOST_SAMPLES, outline, progress)
     values, seconds, said = _columns(reader, chosen, time, start, outlines, whole)
     if not len(values):
         raise InputError(f"{path}: has no value from sample {start + 1} on")

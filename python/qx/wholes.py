@@ -79,7 +79,8 @@ class Whole:
     """Figures of all samples of a file. Of one that is not longer than `kept` samples only the outline
     is made: the other sections have the samples."""
 
-    def __init__(self, kept, outline=Envelope):
+    def __init__(self, kept, outline=Envelope, progress=lambda samples: None):
+        self._progress = progress
         self.kept, self.count, self.total, self.squares = kept, 0, 0.0, 0.0
         self.envelope, self.histogram, self.spectrum = outline(), Histogram(), AveragedSpectrum()
         self._waiting = []  # until there are more than are kept
@@ -87,6 +88,7 @@ class Whole:
     def add(self, values):
         if not len(values):
             return
+        self._progress(len(values))
         self.count += len(values)
         self.envelope.add(values)
         self._waiting.append(values)

@@ -26,10 +26,15 @@ def report_on(options):
     reading = reading_options.of(options)
     if many.is_many(options.files):
         return report_on_many(options, reading)
+    import tqdm
+
     from .. import outputs, recording, report
     path = os.path.join(options.output, "report.html")
     outputs.check(path, options.force, "report", outputs.identities(options.files))
-    for line in report.write(recording.read(options.files[0], **reading), path):
+    # A file that is read within a second needs no bar.
+    with tqdm.tqdm(unit=" samples", unit_scale=True, delay=1, leave=False, disable=not sys.stderr.isatty()) as bar:
+        read = recording.read(options.files[0], **reading, progress=bar.update)
+    for line in report.write(read, path):
         print(line)
     print(f"\nThe report with plots: {path}")
 
