@@ -163,7 +163,7 @@ class Figure {
       this.graph = new Dygraph(this.canvas, this.filled(rows), {
         labels: [plot.x_label.replace(/ \(.*/, "") || "x", ...unique], series, dateWindow: this.window,
         colors: plot.curves.length ? plot.curves.map(curve => colour(curve.colour)) : [colour("blue")],
-        labelsDiv: this.legend, legend: "always", valueRange: this.range(), axisLineColor: colour("grey"),
+        labelsDiv: this.legend, legend: "always", drawGrid: !plot.image, valueRange: this.range(), axisLineColor: colour("grey"),
         gridLineColor: colour("grid"), gridLineWidth: 0.8, axisLabelWidth: 64, connectSeparatedPoints: false, digitsAfterDecimal: 6,
         sigFigs: 6, xRangePad: 0, yRangePad: plot.y_range ? 0 : 6, highlightCircleSize: 3,
         axes: {x: {logscale: this.log, axisLabelFormatter: short, valueFormatter: short, pixelsPerLabel: 70},
