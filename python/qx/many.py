@@ -10,6 +10,7 @@ import html
 import multiprocessing
 import os
 import signal
+import sys
 import threading
 from pathlib import Path
 
@@ -19,6 +20,7 @@ from .files import COMPRESSED, InputError
 from .stored import ENDINGS as STORED
 
 TABLES = (".csv", ".txt", ".tsv", ".tab", ".dat", ".asc", ".prn")
+QUIET = "ignore:resource_tracker"  # which tells of semaphores where Ctrl-C had to end this process at once
 MAIN = ("Mean", "Root mean square", "Standard deviation", "Strongest part at", "Resolution")
 
 
@@ -97,6 +99,8 @@ def report_on(name, path, options):
 def _local(workers):
     """Processes that end at once where the work is interrupted, and where this process ends, in
     whatever way: each watches a pipe whose other end is held here."""
+    if QUIET not in sys.warnoptions:  # of the processes that are started
+        sys.warnoptions.append(QUIET)
     context = multiprocessing.get_context("spawn")
     watched, held = context.Pipe(duplex=False)
     with watched, held:

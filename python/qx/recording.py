@@ -18,7 +18,7 @@ from .files import InputError  # noqa: F401, for those who read recordings
 from .wholes import Whole
 
 WIDEST = 1e307  # with the margins of a plot still a double
-MOST_SAMPLES = 1 << 24  # that are kept of one recording
+MOST_SAMPLES = 1 << 22  # that are kept of one recording
 MOST_CHANNELS = 64  # that a page shows
 
 
@@ -63,9 +63,9 @@ def read(path, rate=None, column=None, decimal=None, missing=None, start=0, time
     file says, whose times are not read then; `column` and `time` are names or numbers from 1, `time` "none"
     where no column is time; `decimal` is "point" or "comma"; `thousands` says that a single mark before three
     digits groups thousands; `dates` is "dmy" or "mdy" for dates that may be either; `missing` values are
-    refused, or "skip" or "interpolate"; `start` samples are left out. `outline` makes what the
-    values of each channel are added to: the `envelope` of the recording and of the other channels; `progress` is told of each part how
-    many samples it has."""
+    refused, or "skip" or "interpolate"; `start` samples are left out. `outline` makes what the values of each
+    channel are added to: the `envelope` of the recording and of the other channels; `progress` is told of each
+    part how many samples it has."""
     with opened(path) as source:
         if audio.is_audio(source.name, source.head):
             recording = _of_audio(source, column, start, outline, progress)

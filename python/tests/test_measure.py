@@ -1,6 +1,8 @@
 """Peaks, events and pulses: the module, the section of the report, the commands."""
 
+import contextlib
 import csv
+import io
 import os
 import subprocess
 import sys
@@ -14,7 +16,8 @@ PYTHON = Path(__file__).resolve().parent.parent
 RECORDING = PYTHON.parent / "examples/data/ecg_208_360hz.csv"
 sys.path.insert(0, str(PYTHON))
 import qx  # noqa: E402
-from qx import measuring, recording, report, sections_measuring  # noqa: E402, F401
+from qx import __main__ as command  # noqa: E402
+from qx import measuring, recording, sections_measuring  # noqa: E402
 
 
 def recorded(values, rate=None):
@@ -146,8 +149,12 @@ class Commands(unittest.TestCase):
         self.table = os.path.join(folder.name, "out.csv")
 
     def run_command(self, *arguments):
-        return subprocess.run([sys.executable, "-m", "qx", *map(str, arguments)], text=True,
-                              capture_output=True, env={**os.environ, "PYTHONPATH": str(PYTHON)})
+        with contextlib.redirect_stdout(io.StringIO()) as out, contextlib.redirect_stderr(io.StringIO()) as err:
+            try:
+                code = command.main([*map(str, arguments)])
+            except SystemExit as refused:  # of arguments
+                code = refused.code
+        return subprocess.CompletedProcess(arguments, code, out.getvalue(), err.getvalue())
 
     def written(self):
         with open(self.table, encoding="utf-8") as file:

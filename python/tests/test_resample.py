@@ -1,5 +1,7 @@
 """The command resample: WAV files at another rate."""
 
+import contextlib
+import io
 import os
 import re
 import subprocess
@@ -16,6 +18,7 @@ import numpy as np
 import soundfile
 
 import qx
+from qx import __main__ as command
 from qx import resampling
 
 
@@ -36,8 +39,12 @@ class Resample(unittest.TestCase):
         self.source, self.target = (os.path.join(folder.name, name) for name in ("in.wav", "out.wav"))
 
     def command(self, *arguments):
-        return subprocess.run([sys.executable, "-m", "qx", "resample", *arguments], text=True,
-                              capture_output=True, env={**os.environ, "PYTHONPATH": PYTHON})
+        with contextlib.redirect_stdout(io.StringIO()) as out, contextlib.redirect_stderr(io.StringIO()) as err:
+            try:
+                code = command.main(["resample", *map(str, arguments)])
+            except SystemExit as refused:  # of arguments
+                code = refused.code
+        return subprocess.CompletedProcess(arguments, code, out.getvalue(), err.getvalue())
 
     def test_tones_keep_their_frequency_phase_and_level(self):
         for rate, new_rate, n in ((48000, 44100, 48001), (44100, 48000, 70000), (8000, 44100, 900),

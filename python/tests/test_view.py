@@ -100,7 +100,8 @@ class Server(InFolder):
 
     def test_names_are_text(self):
         path = self.folder / "<img src=x onerror=alert(1)>&'.csv"
-        path.write_text("time,<script>alert(1)</script>,</script><i id=x>\n" + "".join(f"{i},{i % 7},{i % 5}\n" for i in range(99)))
+        path.write_text("time,<script>alert(1)</script>,</script><i id=x>\n"
+                        + "".join(f"{i},{i % 7},{i % 5}\n" for i in range(99)))
         served = self.served(path, ECG)
         pages = [served.get(served.parts.path + part)[1] for part in ("", "0/")]
         pages += [served.ask("sections", channel=1)[1]["html"]]
@@ -118,7 +119,8 @@ class Server(InFolder):
         for part in np.split(x, [1, 100, 70_000]):
             levels.add(part)
         levels.finish()
-        for first, last, most in ((0, 300_001, 10), (0, 300_001, 1000), (5, 300_001, 100_000), (77, 99, 100), (250, 9000, 50)):
+        for first, last, most in ((0, 300_001, 10), (0, 300_001, 1000), (5, 300_001, 100_000), (77, 99, 100),
+                                  (250, 9000, 50)):
             start, group, lows, highs = levels.seen(first, last, most)
             self.assertLessEqual(start, first)
             self.assertLessEqual(len(lows), 2 * most + 2)
