@@ -148,10 +148,8 @@ def plane(poles, zeros):
 
 
 def coefficients(filter_):
-    if filter_.is_iir:
-        names, rows = ("b0", "b1", "b2", "a0", "a1", "a2"), filter_.sos
-    else:
-        names, rows = ("h",), filter_.taps[:, None]
+    names = ["b0", "b1", "b2", "a0", "a1", "a2"] if filter_.is_iir else ["h"]
+    rows = filter_.sos if filter_.is_iir else filter_.taps[:, None]
     head = "".join(f"<th>{name}</th>" for name in ("", *names))
     body = "".join(f"<tr><th>{i}</th>" + "".join(f'<td class="value">{value!r}</td>' for value in row) + "</tr>\n"
                    for i, row in enumerate(rows.tolist()))

@@ -2,6 +2,7 @@
 
 import dataclasses
 import math
+from typing import Any
 
 import numpy as np
 
@@ -113,7 +114,7 @@ def fit(model, columns, options=Options(), order=2):
     else:
         bounds = {name: (options.lower.get(name, -math.inf), options.upper.get(name, math.inf))
                   for name in {**options.lower, **options.upper}}
-        said = {"bounds": bounds, "method": METHODS[options.method]}
+        said: dict[str, Any] = {"bounds": bounds, "method": METHODS[options.method]}
         if model != "line":
             said["guess"] = options.guess or None
         found = getattr(topic, model)(columns.x, columns.y, sigma, **said)

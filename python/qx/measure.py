@@ -482,7 +482,7 @@ def pulses(x: ArrayLike, fs: float = 1.0, first: Literal["rising", "falling"] = 
     >>> x = np.interp(np.arange(100), [20, 30, 60, 70], [0.0, 1.0, 1.0, 0.0])
     >>> found, = qx.measure.pulses(x, fs=10)
     >>> round(found.width, 3), round(found.rise, 3)
-    (4.0, 0.792)
+    (4.0, 0.8)
     """
     fs = _rate("pulses", fs)
     direction = chosen("measure.pulses", "first", first, POLARITIES)

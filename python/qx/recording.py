@@ -128,13 +128,13 @@ def _of_audio(source, column, start, outline, progress):
     if wrong := audio.wrong_length(path, frames):
         choice += f"; {wrong}"
     return Recording(source.name, values, rate or None, "from the header of the file", "FS",
-                     f"channel {channel} of {channels}", [], choice, *_if_longer(whole, start), others=shown)
+                     f"channel {channel} of {channels}", [], choice, _if_longer(whole),
+                     None if start else whole.envelope, shown)
 
 
-def _if_longer(whole, start):
-    """The figures of all samples where the values are a part of them, and their outline."""
-    is_longer = whole.count > MOST_SAMPLES
-    return whole if is_longer else None, None if start else whole.envelope
+def _if_longer(whole):
+    """The figures of all samples where the values are a part of them."""
+    return whole if whole.count > MOST_SAMPLES else None
 
 
 def _listed(names, most=12):
@@ -172,9 +172,12 @@ def _of_table(reader, column, time, missing, start, rate, habit, outline, progre
     label, unit = _label(layout, chosen, reader.notes)
     choice = "; ".join([*_told_of_columns(reader, values, chosen, time, indices), *reader.told, *said])
     choice += _part(start, len(values), whole.count)
-    shown = [Channel(*_label(layout, c, reader.notes), outline) for c, outline in outlines.items()]
+    shown = []
+    for c, one in outlines.items():
+        name, its_unit = _label(layout, c, reader.notes)
+        shown.append(Channel(name, its_unit, one))
     return Recording(reader.name, values, rate, source, unit, label, reader.notes, choice,
-                     *_if_longer(whole, start), others=shown)
+                     _if_longer(whole), None if start else whole.envelope, shown)
 
 
 def _refuse_wrapped(reader, column):

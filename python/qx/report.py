@@ -5,6 +5,7 @@ recording is too short for it; SECTIONS lists them in the order of the page.
 """
 
 import html
+from collections.abc import Callable
 
 from . import outputs, pages
 from .outcomes import QxError
@@ -14,7 +15,8 @@ from .sections_measuring import events
 from .sections_recording import histogram, overview, statistics
 from .sections_spectra import amplitudes, over_time, power
 
-SECTIONS = [overview, statistics, histogram, amplitudes, power, over_time, cleaned, events]
+SECTIONS: list[Callable[..., Section | None]] = [
+    overview, statistics, histogram, amplitudes, power, over_time, cleaned, events]
 
 
 def page(recording, sections):

@@ -72,8 +72,7 @@ def statistics(recording):
     mean = stats.mean(x)
     moments = {order: stats.moment(x, order) for order in (2, 3, 4)}
     bins = bins_for(len(x))
-    modes = stats.mode(x, bins)
-    shown = [mean, stats.rms(x), stats.median(x), *modes[:4]]
+    shown = [mean, stats.rms(x), stats.median(x), *stats.mode(x, bins)[:4]]
     # Digits for a thousandth of the range, and no less than six.
     mean_, rms, median, *modes = (max(pair, key=len) for pair in zip(
         map(number, shown), resolved(shown, 1e-3 * float(np.ptp(x)))))

@@ -1,5 +1,7 @@
 """Figures of a recording of any length, part by part: moments, outline, histogram and spectrum."""
 
+from typing import Any
+
 import numpy as np
 
 from . import spectra, stats
@@ -54,7 +56,8 @@ class AveragedSpectrum:
 
     def __init__(self, segment=SEGMENT, window="hann"):
         self.segment, self.window = segment, window
-        self._sum, self._segments, self._rest = 0.0, 0, np.empty(0)
+        self._sum: Any = 0.0
+        self._segments, self._rest = 0, np.empty(0)
 
     def add(self, values):
         values = np.concatenate([self._rest, values])
