@@ -140,11 +140,6 @@ class Figure {
     return rows.length ? rows : [[this.source.range[0], NaN], [this.source.range[1], NaN]];
   }
 
-  range() {
-    if (this.plot.y_range) return this.plot.y_range;
-    return null;
-  }
-
   draw(window) {
     const plot = this.plot, names = plot.curves.length ? plot.curves.map((curve, i) => curve.name || "y" + i) : ["y"];
     const unique = names.map((name, i) => names.indexOf(name) < i ? name + " " + (i + 1) : name);
@@ -163,7 +158,7 @@ class Figure {
       this.graph = new Dygraph(this.canvas, this.filled(rows), {
         labels: [plot.x_label.replace(/ \(.*/, "") || "x", ...unique], series, dateWindow: this.window,
         colors: plot.curves.length ? plot.curves.map(curve => colour(curve.colour)) : [colour("blue")],
-        labelsDiv: this.legend, legend: "always", drawGrid: !plot.image, valueRange: this.range(), axisLineColor: colour("grey"),
+        labelsDiv: this.legend, legend: "always", drawGrid: !plot.image, valueRange: plot.y_range, axisLineColor: colour("grey"),
         gridLineColor: colour("grid"), gridLineWidth: 0.8, axisLabelWidth: 64, connectSeparatedPoints: false, digitsAfterDecimal: 6,
         sigFigs: 6, xRangePad: 0, yRangePad: plot.y_range ? 0 : 6, highlightCircleSize: 3,
         axes: {x: {logscale: this.log, axisLabelFormatter: short, valueFormatter: short, pixelsPerLabel: 70},
@@ -246,12 +241,8 @@ function line(canvas, x, y, toX, toY, name) {
   canvas.setLineDash([]);
 }
 
-// A number in no more digits than tell it from its neighbours; on axes, those of the step of the labels.
-function short(value, granularity, options, graph) {
-  if (typeof granularity === "number" && graph) {
-    const range = Math.abs(value) * 1e-12;
-    if (Math.abs(value) <= range) return "0";
-  }
+// A number for axes and legends.
+function short(value) {
   if (value !== 0 && (Math.abs(value) >= 1e7 || Math.abs(value) < 1e-4)) {
     return Number(value.toPrecision(7)).toExponential();
   }

@@ -18,14 +18,14 @@ FALSE = 0.01  # chance that noise alone has a tone that counts
 
 @dataclasses.dataclass
 class Tones:
-    """Tones, the largest first; errors are standard uncertainties. A tone that `stands` is more than noise
-    of its neighbourhood would have."""
+    """Tones, the largest first; errors are standard uncertainties. A tone is significant where it is more than
+    the noise about it would have."""
     frequencies: np.ndarray
     frequency_errors: np.ndarray
     amplitudes: np.ndarray
     amplitude_errors: np.ndarray
     phases: np.ndarray  # of cosines, at the first sample
-    stands: np.ndarray
+    significant: np.ndarray
     residual_rms: float
     resolution: float  # one over the length of the recording
 
@@ -37,7 +37,7 @@ def tones(values, rate=1.0, count=5):
     noise about the tone, S, in place of that of white noise: sqrt(S fs / n) of the amplitude A, and
     sqrt(3 S fs / (n (n^2 - 1))) fs / (pi A) of the frequency (D. C. Rife and R. R. Boorstyn, "Single-tone
     parameter estimation from discrete-time observations", 1974). What a tone has about it that is no
-    tone, such as a changing amplitude, counts as noise. A tone stands where the ratio of its line to the mean of
+    tone, such as a changing amplitude, counts as noise. A tone is significant where the ratio of its line to the mean of
     those around it has a chance below FALSE in noise, by the F distribution and for n / 2 lines."""
     n = len(values)
     scale = float(np.abs(values).max()) or 1.0
@@ -66,9 +66,9 @@ def strongest(values, rate, count=5):
         if not error.name.startswith("ErrMeasure"):
             raise
         return None
-    kept = {field.name: getattr(found, field.name)[found.stands] for field in dataclasses.fields(found)
+    kept = {field.name: getattr(found, field.name)[found.significant] for field in dataclasses.fields(found)
             if isinstance(getattr(found, field.name), np.ndarray)}
-    return dataclasses.replace(found, **kept) if found.stands.any() else None
+    return dataclasses.replace(found, **kept) if found.significant.any() else None
 
 
 def spectrum(values, rate=1.0, window=WINDOW):

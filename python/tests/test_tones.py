@@ -25,7 +25,7 @@ class Topic(unittest.TestCase):
         found = tones.tones(SIGNAL, RATE, 3)
         np.testing.assert_allclose(found.frequencies, [50, 83.3, 150], rtol=1e-9)
         np.testing.assert_allclose(found.amplitudes, [2, 0.1, 0.02], rtol=1e-9)
-        self.assertTrue(found.stands.all())
+        self.assertTrue(found.significant.all())
 
     def test_uncertainties_are_the_scatter_of_the_estimates(self):
         rng, n = np.random.default_rng(2), 1000

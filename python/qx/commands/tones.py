@@ -43,8 +43,8 @@ def tones(options):
                        found.phases))
     show_texts([names[0], "±", names[1], "±", names[2]],
                [(*uncertain(*row[:2]), *uncertain(*row[2:4]), f"{row[4]:.6g}") for row in columns])
-    if not found.stands.all():
-        print("Could be noise: " + ", ".join(f"{f:.6g}" for f in found.frequencies[~found.stands]))
+    if not found.significant.all():
+        print("Could be noise: " + ", ".join(f"{f:.6g}" for f in found.frequencies[~found.significant]))
     print("Harmonics")
     rows = [(h, *row) for h, row in enumerate(zip(analysis.frequencies, analysis.amplitudes,
                                                   analysis.phases), 1)]
