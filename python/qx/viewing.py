@@ -24,11 +24,10 @@ MOST = 1 << 22  # samples of which sections are made
 
 class Levels:
     """The samples of a channel in a file, and the lowest and highest of blocks. Filled part by part, as an
-    Envelope is."""
+    Envelope is. The file has no name, so its room is free again when the process ends, in whatever way."""
 
-    def __init__(self, folder):
-        number_, self._path = tempfile.mkstemp(dir=folder)
-        self._file = os.fdopen(number_, "wb")
+    def __init__(self):
+        self._file = tempfile.TemporaryFile()
         self._parts, self._rest, self.count = [], np.empty(0), 0
 
     def add(self, values):
@@ -42,12 +41,13 @@ class Levels:
         self._rest = values[whole:].copy()
 
     def finish(self):
+        self._file.flush()
+        self.values = np.memmap(self._file, float, "r", shape=(self.count,))
         self._file.close()
         if len(self._rest):
             self._parts.append(figures.extremes(self._rest, BLOCK))
         blocks = tuple(map(np.concatenate, zip(*self._parts)))
         self._blocks = [(BLOCK, *blocks), (BLOCK**2, *figures.extremes(blocks[0], BLOCK, blocks[1]))]
-        self.values = np.memmap(self._path, float, "r", shape=(self.count,))
         self._parts, self._rest = [], np.empty(0)
 
     def seen(self, first, last, most):
@@ -85,7 +85,7 @@ class Opened:
         self.path, self.options = path, options
         self.name = os.path.basename(path)
         self._lock = threading.Lock()
-        self._folder = self._seen = None
+        self._seen = None
         self.version = 0
         self.read()
 
@@ -106,19 +106,14 @@ class Opened:
             status = self._status()
             if status == self._seen and self.version:
                 return
-            folder = tempfile.TemporaryDirectory(prefix="qx_view_")
-            try:
-                self._take(recording.read(self.path, **self.options, outline=lambda: Levels(folder.name)), folder)
-            except BaseException:
-                folder.cleanup()
-                raise
-            self._folder, self._seen = folder, status  # the one before goes with the last who uses it
+            self._take(recording.read(self.path, **self.options, outline=Levels))
+            self._seen = status
             self.version += 1
 
-    def _take(self, read, folder):
+    def _take(self, read):
         main = read.envelope
         if main is None or main.count != len(read.values) and not read.whole:
-            main = Levels(folder.name)  # missing values have been filled in
+            main = Levels()  # missing values have been filled in
             main.add(read.values)
         channels = [(read.channel, read.unit, main)]
         channels += [(other.channel, other.unit, other.envelope) for other in read.others]

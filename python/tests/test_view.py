@@ -115,7 +115,7 @@ class Server(InFolder):
     def test_levels_of_detail_have_the_extremes_of_the_samples(self):
         rng = np.random.default_rng(1)
         x = rng.normal(size=300_001)
-        levels = viewing.Levels(self.folder)
+        levels = viewing.Levels()
         for part in np.split(x, [1, 100, 70_000]):
             levels.add(part)
         levels.finish()

@@ -11,7 +11,7 @@ examples:
   python3 -m qx view --port 8800 examples/data/ecg_208_360hz.csv
 
 The page is served to this machine alone, under the address that is printed, until Ctrl-C. It has all samples,
-of recordings of any length: they are put into a folder for temporary files, 8 bytes each."""
+of recordings of any length: they are put into temporary files, 8 bytes each."""
 
 
 def port(text):
