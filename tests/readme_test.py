@@ -49,6 +49,11 @@ soundfile.write("IN.wav", 0.5 * np.sin(0.05 * np.arange(48000)), 48000)
 """
 NAMES = {"peaks FILE": "peaks measurement.csv", "pulse FILE": "pulse measurement.csv",
          "tones FILE": "tones measurement.csv",
+         "view FILE": "view measurement.csv >view.log & "  # which serves until it is ended
+                      "while kill -0 $! && ! grep -q http view.log; do sleep 0.1; done; "
+                      "python3 -c 'import urllib.request as r; "
+                      "assert b\"<h1>measurement.csv\" in r.urlopen(open(\"view.log\").read().strip()).read()'; "
+                      "kill $!",
          "fit FILE": "fit decay.csv"}
 
 # What must hold after a command that begins so, as a command of its own.
