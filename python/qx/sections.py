@@ -44,7 +44,7 @@ def uncertain(value, error):
     value, error = float(value), float(error)
     if not (math.isfinite(value) and math.isfinite(error) and error > 1e-15 * abs(value)):
         return number(value, 12), number(error, 2) if error > 0 or not math.isfinite(error) else ""
-    return resolved([value], error)[0], number(error, 2)
+    return resolved([value], error)[0], f"{error:#.2g}".rstrip(".")
 
 
 def power_unit(unit, exponent):

@@ -20,7 +20,8 @@ PYTHON = Path(__file__).resolve().parent.parent
 sys.path.insert(0, str(PYTHON))
 import qx  # noqa: E402
 from qx import __main__ as command  # noqa: E402
-from qx import audio, pages, recording, report, sections_recording, sections_spectra, tables, wholes  # noqa: E402
+from qx import audio, pages, recording, report, sections, sections_recording, sections_spectra  # noqa: E402
+from qx import tables, wholes  # noqa: E402
 
 ECG = PYTHON.parent / "examples/data/ecg_208_360hz.csv"
 
@@ -297,6 +298,13 @@ class Report(InFolder):
             np.testing.assert_allclose(step, step.mean(), rtol=0.2)
             strongest = [float(part[1]) for line in lines if (part := re.search(r"Tone at (\S+) ", line))]
             self.assertAlmostEqual(strongest[0], 100 / 9 / (2 * np.pi), delta=1e-6)
+
+    def test_uncertain_values_have_the_digits_that_hold(self):
+        for value, error, shown in ((50.4999998, 0.00121, ("50.5000", "0.0012")), (1.5050411, 0.005, ("1.5050", "0.0050")),
+                                    (-1234.5, 28, ("-1234", "28")), (2.6e8, 3.2e7, ("2.60e+08", "3.2e+07")),
+                                    (0.1, 0, ("0.1", "")), (1 / 3, 1e-18, ("0.333333333333", "1e-18")),
+                                    (5, float("inf"), ("5", "beyond all numbers"))):
+            self.assertEqual(sections.uncertain(value, error), shown)
 
     def test_figures_beyond_all_numbers_have_a_plain_sentence(self):
         wave = np.sin(np.arange(300) / 9)
