@@ -29,7 +29,7 @@ typedef struct Interval {
     int32_t closure; /* of Ends,
                         or 0 */
     DBL1D edges;
-    int32_t spare[2];
+    int32_t packed[2];
 } Interval;
 typedef QX_ARRAY_1D(Interval) Interval1D;
 typedef struct Plan Plan;
@@ -98,11 +98,12 @@ class Reading(unittest.TestCase):
                          ("Plan *", "Stars in the margin\n  and an indented line."))
         self.assertEqual((forget["arguments"], forget["documentation"]), ([], "No arguments."))
         self.assertEqual([f["name"] for f in result["records"]["Interval"]["fields"]],
-                         ["lower", "upper", "closure", "edges", "spare"])
+                         ["lower", "upper", "closure", "edges", "packed"])
         self.assertEqual([(f.get("element"), f.get("array"), f.get("dimensions"))
                           for f in result["records"]["Interval"]["fields"]][2:4],
                          [("I32", None, None), (None, "DBL", 1)])
         self.assertTrue(result["records"]["WorkspaceStatus"]["packed"])
+        self.assertFalse(result["records"]["Interval"]["packed"], "the name of a field")
         self.assertEqual(result["records"]["Interval"]["documentation"], "A pair.")
         self.assertEqual([f.get("documentation") for f in result["records"]["Interval"]["fields"]],
                          [None, None, "of Ends, or 0", None, None])

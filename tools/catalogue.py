@@ -51,6 +51,7 @@ SCALARS = {
 WHOLE = ("I32", "I16", "U8", "U16", "U32")
 DIRECTIONS = {"QX_IN": "in", "QX_OUT": "out", "QX_INOUT": "inout"}
 HANDLE_DIMENSIONS = {"QX_ARRAY_1D": 1, "QX_ARRAY_2D": 2, "QX_ARRAY_3D": 3}
+ATTRIBUTES = {"QX_ANY_ALIGNMENT", "QX_MAY_ALIAS", "QX_PACKED"}  # of types.h
 UNTYPED_HANDLES = {"Array1DHandle", "Array2DHandle", "Array3DHandle"}
 
 TOKEN = re.compile(
@@ -135,17 +136,7 @@ def split(words, separator=","):
 
 
 def without_attributes(words):
-    words = list(words)
-    while "__attribute__" in words:
-        start = words.index("__attribute__")
-        end, depth = start + 1, 0
-        while True:
-            depth += (words[end] == "(") - (words[end] == ")")
-            end += 1
-            if depth == 0:
-                break
-        del words[start:end]
-    return words
+    return [word for word in words if word not in ATTRIBUTES]
 
 
 def spelled(words):
@@ -211,7 +202,7 @@ class Types:
         for field in fields:
             if field["name"] in remarks:
                 field["documentation"] = remarks[field["name"]]
-        self.records[names[0]] = {"packed": "packed" in words, "fields": fields}
+        self.records[names[0]] = {"packed": "QX_PACKED" in words, "fields": fields}
         if statement.comment:
             self.records[names[0]]["documentation"] = documentation_of(statement.comment)
 

@@ -23,13 +23,13 @@
 QX_BEGIN_DECLS
 
 /* A host block of three dimensions: the three sizes, then the elements from byte 12. */
-typedef struct __attribute__((may_alias)) Array3DBlock {
+typedef struct QX_MAY_ALIAS Array3DBlock {
     int32_t dimSizes[3];
 } Array3DBlock;
 typedef Array3DBlock **Array3DHandle;
 
 #define QX_ARRAY_3D(element)                                                                       \
-    struct __attribute__((may_alias)) QXArray3D_##element {                                        \
+    struct QX_MAY_ALIAS QXArray3D_##element {                                                      \
         int32_t dimSizes[3];                                                                       \
     } * *
 typedef QX_ARRAY_3D(DBL) DBL3D;

@@ -20,6 +20,7 @@ QX_API int32_t FIRCoefs(QX_IN const double *fs, QX_IN const double *fl, QX_IN co
                         QX_IN const int32_t *taps, QX_OUT DBL1D h, QX_INOUT int32_t *type,
                         QX_OUT ErrorCode *err);
 
+#pragma pack(push, 1)
 /* One band of Parks: what is desired between two edges, and how much a deviation from it counts. */
 typedef struct RemezBand {
     DBL desired; /* a gain, or the slope of a differentiator: gain by cycles per sample */
@@ -27,6 +28,7 @@ typedef struct RemezBand {
     DBL fHigh;
     DBL weight; /* in a differentiator divided by the frequency where the slope is not 0 */
 } RemezBand;
+#pragma pack(pop)
 
 /* An array of RemezBand: a one-dimensional block of records. */
 typedef QX_ARRAY_1D(RemezBand) RemezBand1D;

@@ -50,13 +50,15 @@ typedef struct CxResampleState {
     int32_t position;
 } CxResampleState;
 
+#pragma pack(push, 1)
 /* How the exports for a list of times shall work. */
-typedef struct __attribute__((packed)) VariableDesign {
+typedef struct QX_PACKED VariableDesign {
     int32_t mode;
     uint8_t antiAlias; /* stretches the kernel to the gap before each time */
     DBL1D proto;
     int32_t oversample;
 } VariableDesign;
+#pragma pack(pop)
 
 /** The samples of a stream at times start, start + ratio, start + 2 ratio ... With `antiAlias` the
     kernel is stretched by ratio, without it by no more than 1. `reset` begins a stream; state is

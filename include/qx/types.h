@@ -22,6 +22,20 @@
 #define QX_API __attribute__((visibility("default")))
 #endif
 
+/* What the compiler has to know of the types: elements that stand at any byte, blocks whose elements
+   have another type, and records without gaps. Compilers without attributes know the last by the
+   pragma around the record, which is there for all of them; they take a pointer to elements for
+   what it is, and read and write it at any address. */
+#if defined(__GNUC__)
+#define QX_ANY_ALIGNMENT __attribute__((aligned(1)))
+#define QX_MAY_ALIAS __attribute__((may_alias))
+#define QX_PACKED __attribute__((packed))
+#else
+#define QX_ANY_ALIGNMENT
+#define QX_MAY_ALIAS
+#define QX_PACKED
+#endif
+
 /* The direction of an argument, read by tools/catalogue.py. An argument without a mark is an
    input scalar. */
 #define QX_IN
@@ -37,17 +51,19 @@ typedef int32_t ErrorCode;
 
 /* Elements. Those of a one-dimensional block start at byte 4, so a DBL stands at an address that
    is 4 modulo 8, and scratch blocks may start at any byte: the types say so to the compiler. */
-typedef int32_t I32 __attribute__((aligned(1)));
+typedef int32_t I32 QX_ANY_ALIGNMENT;
 typedef uint8_t U8;
-typedef uint32_t U32 __attribute__((aligned(1)));
-typedef float SGL __attribute__((aligned(1)));
-typedef double DBL __attribute__((aligned(1)));
+typedef uint32_t U32 QX_ANY_ALIGNMENT;
+typedef float SGL QX_ANY_ALIGNMENT;
+typedef double DBL QX_ANY_ALIGNMENT;
+#pragma pack(push, 1)
 typedef struct CSG {
     SGL re, im;
 } CSG;
 typedef struct CDB {
     DBL re, im;
 } CDB;
+#pragma pack(pop)
 
 /* Element type codes, the first argument of HostBlockReshape. */
 enum QXTypeCode {
@@ -61,12 +77,12 @@ enum QXTypeCode {
 };
 
 /* A host block of one dimension: the count, then the elements from byte 4. */
-typedef struct __attribute__((may_alias)) Array1DBlock {
+typedef struct QX_MAY_ALIAS Array1DBlock {
     int32_t dimSize;
 } Array1DBlock;
 
 /* A host block of two dimensions: rows, columns, then the elements from byte 8, row after row. */
-typedef struct __attribute__((may_alias)) Array2DBlock {
+typedef struct QX_MAY_ALIAS Array2DBlock {
     int32_t dimSizes[2];
 } Array2DBlock;
 
@@ -78,11 +94,11 @@ typedef struct __attribute__((may_alias)) Array2DBlock {
    carry arrays included. Two outputs may not be one array: ErrInternal, whatever the export, before
    anything else is looked at. A block that says a negative size is an empty array. */
 #define QX_ARRAY_1D(element)                                                                       \
-    struct __attribute__((may_alias)) QXArray1D_##element {                                        \
+    struct QX_MAY_ALIAS QXArray1D_##element {                                                      \
         int32_t dimSize;                                                                           \
     } * *
 #define QX_ARRAY_2D(element)                                                                       \
-    struct __attribute__((may_alias)) QXArray2D_##element {                                        \
+    struct QX_MAY_ALIAS QXArray2D_##element {                                                      \
         int32_t dimSizes[2];                                                                       \
     } * *
 typedef QX_ARRAY_1D(I32) I32_1D;
@@ -100,11 +116,13 @@ typedef QX_ARRAY_2D(CDB) CDB2D;
 typedef Array1DBlock **Array1DHandle;
 typedef Array2DBlock **Array2DHandle;
 
+#pragma pack(push, 1)
 /* What the four workspace exports report into; packed by the host. */
-typedef struct __attribute__((packed)) WorkspaceStatus {
+typedef struct QX_PACKED WorkspaceStatus {
     uint8_t status; /* non-zero when an earlier step failed: the export then does nothing */
     int32_t code;   /* the ErrorCode of the last step that ran */
 } WorkspaceStatus;
+#pragma pack(pop)
 
 QX_END_DECLS
 

@@ -34,11 +34,13 @@
 
 QX_BEGIN_DECLS
 
+#pragma pack(push, 1)
 /* Two numbers that describe a window of n values w. */
 typedef struct WindowConstants {
     DBL enbw; /* equivalent noise bandwidth in bins, n sum(w^2) / sum(w)^2 */
     DBL cg;   /* coherent gain, sum(w) / n */
 } WindowConstants;
+#pragma pack(pop)
 
 /** Kaiser window: I0(beta sqrt(1 - u^2)) / I0(beta) with u = 1 - 2i/n. The Bessel series stops
     after 25 terms, so a large beta is cut short: the window is off by 6e-10 at beta 20, by 4e-7 at

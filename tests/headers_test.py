@@ -1,0 +1,71 @@
+"""The public C headers for compilers without attributes: they are read without one, and give the records
+that they have with them.
+
+    headers_test.py SOURCE
+"""
+
+import re
+import shutil
+import subprocess
+import sys
+import tempfile
+import unittest
+from pathlib import Path
+
+SOURCE = Path(sys.argv.pop(1)).resolve()
+sys.path.insert(0, str(SOURCE / "tools"))
+import catalogue  # noqa: E402
+
+# What such a compiler makes of a GNU attribute is a fault.
+NO_ATTRIBUTES = ("-D__attribute__(x)=@", "-U__GNUC__")
+PROCESSORS = ("x86_64", "i686")
+
+
+def compiled(target, source, *options):
+    """The output of clang for a target, without headers of a system."""
+    ran = subprocess.run(["clang", f"--target={target}", "-std=c11", "-ffreestanding", "-Wall", "-Wextra", "-Werror",
+                          "-Wno-unused-function", "-I", SOURCE / "include", *options, source],
+                         capture_output=True, text=True)
+    if ran.returncode:
+        raise AssertionError(f"{target}: {ran.stderr[-3000:]}")
+    return ran.stdout
+
+
+def probe():
+    """A source with the size, the alignment and the places of the fields of every record."""
+    records = catalogue.read_headers(SOURCE / "include")["records"]
+    includes = "".join(f'#include "qx/{path.name}"\n' for path in sorted((SOURCE / "include/qx").glob("*.h")))
+    lines = []
+    for name, record in records.items():
+        places = ", ".join(f"offsetof({name}, {field['name']})" for field in record["fields"])
+        lines.append(f"const unsigned of_{name}[] = {{sizeof({name}), _Alignof({name}), {places}}};\n")
+    return includes + "#include <stddef.h>\n" + "".join(lines)
+
+
+@unittest.skipUnless(shutil.which("clang"), "clang is not installed")
+class WithoutAttributes(unittest.TestCase):
+    def test_each_header_alone(self):
+        headers = sorted((SOURCE / "include/qx").glob("*.h"))
+        self.assertGreater(len(headers), 50)
+        for processor in PROCESSORS:
+            with self.subTest(processor):
+                for header in headers:
+                    compiled(f"{processor}-pc-windows-msvc", header, "-fsyntax-only", "-xc", *NO_ATTRIBUTES)
+
+    def test_records_are_laid_out_alike(self):
+        with tempfile.TemporaryDirectory() as folder:
+            source = Path(folder) / "probe.c"
+            source.write_text(probe(), "utf-8")
+            for processor in PROCESSORS:
+                with self.subTest(processor):
+                    layouts = [re.findall(r"^@(of_\w+) = .*?(?:\[(i32 .*)\]|(zeroinitializer))", text, re.MULTILINE)
+                               for text in (compiled(f"{processor}-{system}", source, "-S", "-emit-llvm", "-o", "-", *options)
+                                            for system, options in (("w64-windows-gnu", ()),
+                                                                    ("pc-windows-msvc", NO_ATTRIBUTES)))]
+                    self.assertIn(("of_WorkspaceStatus", "i32 5, i32 1, i32 0, i32 1", ""), layouts[0])
+                    self.assertEqual(*layouts)
+
+
+if __name__ == "__main__":
+    ran = unittest.main(exit=False).result
+    sys.exit(77 if ran.wasSuccessful() and ran.skipped else not ran.wasSuccessful())
