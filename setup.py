@@ -35,12 +35,16 @@ class WithLibraries(build_py):
             libraries()  # the package finds them in the tree
             return
         package = Path(self.build_lib) / "qx"
-        for name in ("libqxanalysis.so", "libqxrt.so", "catalogue.json"):
+        ending = "dll" if (libraries() / "qxrt.dll").exists() else "so"
+        prefix = "" if ending == "dll" else "lib"
+        for name in (f"{prefix}qxanalysis.{ending}", f"{prefix}qxrt.{ending}", "catalogue.json"):
             shutil.copy(libraries() / name, package)
         shutil.copytree(libraries() / "licences", package / "licences", dirs_exist_ok=True)
         subprocess.run([sys.executable, "-m", "qx.stubs", package], check=True,
                        env={**os.environ, "PYTHONPATH": os.pathsep.join(
-                           [self.build_lib, *filter(None, sys.path)]), "QX_LIBRARY_DIR": ""})
+                           [self.build_lib, *filter(None, sys.path)]), 
+                            # Libraries of another system cannot be loaded here.
+                            "QX_LIBRARY_DIR": str(BUILD / "release") if ending == "dll" else ""})
 
 
 class HasLibraries(Distribution):
@@ -52,7 +56,7 @@ class OfThisPlatform(bdist_wheel):
     """For any Python 3: the libraries do not know which one loads them."""
 
     def get_tag(self):
-        return "py3", "none", super().get_tag()[2]
+        return "py3", "none", os.environ.get("QX_PLATFORM") or super().get_tag()[2]
 
 
 (BUILD / "python").mkdir(parents=True, exist_ok=True)

@@ -20,6 +20,16 @@ add_custom_target(catalogue ALL
     DEPENDS ${QX_CATALOGUE} ${PROJECT_BINARY_DIR}/exports.map ${PROJECT_BINARY_DIR}/exports.def
         ${PROJECT_BINARY_DIR}/exports.codes ${QX_UMBRELLA})
 
+# The functions of the topics for C++, from the catalogue and the table that the Python topics call by.
+set(QX_CPP_TOPICS ${PROJECT_BINARY_DIR}/include/qx/qx.hpp)
+add_custom_command(OUTPUT ${QX_CPP_TOPICS}
+    COMMAND ${QX_PYTHON} ${PROJECT_SOURCE_DIR}/tools/cpp_topics.py ${QX_CATALOGUE} ${QX_CPP_TOPICS}
+    DEPENDS ${QX_CATALOGUE} ${PROJECT_SOURCE_DIR}/tools/cpp_topics.py
+        ${PROJECT_SOURCE_DIR}/python/qx/topical/newest.py
+    COMMENT "Writing the topics for C++" VERBATIM)
+add_custom_target(cpp_topics ALL DEPENDS ${QX_CPP_TOPICS})
+add_dependencies(cpp_topics catalogue)
+
 # Windows shows what is marked for export and nothing else; elsewhere the linker is told.
 function(qx_show_exports_only target)
     add_dependencies(${target} catalogue)

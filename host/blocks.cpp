@@ -15,6 +15,7 @@ namespace {
 struct Front {
     void *memory;
     std::size_t capacity; // bytes from the first dimension field on
+    bool reserved;        // none of them are given back before the array is
 };
 
 constexpr std::size_t elementAlignment = 64;
@@ -40,6 +41,13 @@ std::size_t ElementSize(int32_t typeCode) {
 
 constexpr std::size_t FieldsSize(int32_t numDims) {
     return sizeof(int32_t) * static_cast<std::size_t>(numDims);
+}
+
+void Reserve(void *block) {
+    Front front;
+    std::memcpy(&front, static_cast<char *>(block) - sizeof front, sizeof front);
+    front.reserved = true;
+    std::memcpy(static_cast<char *>(block) - sizeof front, &front, sizeof front);
 }
 
 Front FrontOf(const void *block) {
@@ -88,7 +96,7 @@ void *NewBlock(int32_t numDims, uint64_t count, std::size_t elementSize, bool cl
     const uintptr_t elements = (start + elementAlignment - 1) / elementAlignment * elementAlignment;
     char *block =
         static_cast<char *>(memory) + (elements - fields) - reinterpret_cast<uintptr_t>(memory);
-    const Front front = {memory, fields + size};
+    const Front front = {memory, fields + size, false};
     std::memcpy(block - sizeof front, &front, sizeof front);
     return block;
 }
@@ -184,6 +192,18 @@ void QXHostFree(void *handle) {
     std::free(handle);
 }
 
+int32_t QXHostReserve1D(void *array, int32_t typeCode, int32_t count) {
+    const std::size_t elementSize = ElementSize(typeCode);
+    if (elementSize == 0 || count < 0 || array == nullptr)
+        return QXHostBadArgument;
+    auto *const handle = static_cast<Array1DHandle>(array);
+    if (FieldsSize(1) + static_cast<uint64_t>(count) * elementSize > FrontOf(*handle).capacity)
+        if (const int32_t refused = HostBlockReshape(typeCode, 1, &array, count))
+            return refused;
+    Reserve(*handle);
+    return QXHostDone;
+}
+
 int32_t HostBlockReshape(int32_t typeCode, int32_t numDims, void *handleAddress, int32_t count) {
     const std::size_t elementSize = ElementSize(typeCode);
     if (elementSize == 0 || count < 0 || numDims < 1 || numDims > 2 || handleAddress == nullptr)
@@ -194,16 +214,19 @@ int32_t HostBlockReshape(int32_t typeCode, int32_t numDims, void *handleAddress,
 
     const auto wanted = static_cast<uint64_t>(count);
     const uint64_t size = FieldsSize(numDims) + wanted * elementSize;
-    const std::size_t capacity = FrontOf(*handle).capacity;
+    const Front front = FrontOf(*handle);
+    const std::size_t capacity = front.capacity;
     const bool fits = size <= capacity;
     const std::size_t used = std::min<uint64_t>(UsedBytes(*handle, numDims, elementSize), size);
     void *moved = nullptr;
-    if (!fits || (capacity > shrinkAbove && size < capacity / 2))
+    if (!fits || (!front.reserved && capacity > shrinkAbove && size < capacity / 2))
         moved = NewBlock(numDims, wanted, elementSize, true);
     if (moved != nullptr) {
         std::memcpy(moved, *handle, used);
         FreeBlock(*handle);
         *handle = moved;
+        if (front.reserved)
+            Reserve(moved);
     } else if (fits)
         std::memset(static_cast<char *>(*handle) + used, 0, static_cast<std::size_t>(size) - used);
     return moved != nullptr || fits ? QXHostDone : QXHostNoMemory;

@@ -91,7 +91,7 @@ class Installed(Using):
 
     def test_headers_stand_alone_and_are_all_there(self):
         names = sorted(path.name for path in (self.prefix / "include/qx").iterdir())
-        expected = {path.name for path in (SOURCE / "include/qx").iterdir()} | {"qx.h"}
+        expected = {path.name for path in (SOURCE / "include/qx").iterdir()} | {"qx.h", "qx.hpp"}
         self.assertEqual(names, sorted(expected))
         includes = "".join(f'#include "qx/{name}"\n' for name in names if name.endswith(".h"))
         run("cc", "-std=c11", "-Wall", "-Wextra", "-Werror", "-fsyntax-only", "-x", "c", "-I",

@@ -110,6 +110,27 @@ TEST(Blocks, GiveMemoryBackWhereItIsWorthAMove) {
     QXHostFree(array);
 }
 
+TEST(Blocks, StayWithinWhatIsReserved) {
+    const double values[] = {1, 2};
+    auto *array = static_cast<Array1DHandle>(QXHostCopy1D(QXTypeDBL, 2, values));
+    ASSERT_EQ(QXHostReserve1D(array, QXTypeDBL, 10000), QXHostDone);
+    EXPECT_EQ((*array)->dimSize, 2);
+    const void *const before = *array;
+    for (const int32_t count : {10000, 1, 10000}) {
+        EXPECT_EQ(HostBlockReshape(QXTypeDBL, 1, &array, count), 0);
+        EXPECT_EQ(*array, before) << count;
+    }
+    EXPECT_EQ(static_cast<DBL *>(QXHostElements1D(array))[0], 1);
+    EXPECT_EQ(HostBlockReshape(QXTypeDBL, 1, &array, 20000), 0);
+    const void *const grown = *array;
+    EXPECT_EQ(HostBlockReshape(QXTypeDBL, 1, &array, 1), 0);
+    EXPECT_EQ(*array, grown) << "what has grown stays reserved";
+    EXPECT_EQ(QXHostReserve1D(array, QXTypeDBL, -1), QXHostBadArgument);
+    EXPECT_EQ(QXHostReserve1D(array, 99, 1), QXHostBadArgument);
+    EXPECT_EQ(QXHostReserve1D(nullptr, QXTypeDBL, 1), QXHostBadArgument);
+    QXHostFree(array);
+}
+
 TEST(Blocks, OfTwoDimensionsStartAtByteEight) {
     const double values[] = {1, 2, 3, 4, 5, 6};
     auto *array = static_cast<Array2DHandle>(QXHostCopy2D(QXTypeDBL, 2, 3, values));

@@ -47,6 +47,9 @@ QX_HOST_API void *QXHostCopy3D(int32_t typeCode, int32_t first, int32_t second, 
    resized. */
 QX_HOST_API void *QXHostCopyRecords(int32_t recordSize, int32_t count, const void *records);
 QX_HOST_API void QXHostFree(void *handle);
+/* Room for `count` elements of an array of one dimension, whose size stays: no resize up to that many
+   moves its block or asks for memory from now on. 0 or a status. */
+QX_HOST_API int32_t QXHostReserve1D(void *array, int32_t typeCode, int32_t count);
 
 /* The first element. It moves with every resize, so with every call that has the array as an
    output. */

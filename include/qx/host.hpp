@@ -9,9 +9,9 @@
 //     Mean_head(x.handle(), &mean, &status);
 //     qx::host::check(status);
 
+#include "qx/elements.hpp"
 #include "qx/host.h"
 
-#include <complex>
 #include <cstddef>
 #include <cstdint>
 #include <initializer_list>
@@ -38,52 +38,6 @@ inline ErrorCode check(ErrorCode code) {
         throw Error(code);
     return code;
 }
-
-// The element types of arrays with their type codes and handle types.
-template <class T>
-struct Element {};
-template <>
-struct Element<int32_t> {
-    static constexpr int32_t typeCode = QXTypeI32;
-    typedef I32_1D Handle1D;
-    typedef I32_2D Handle2D;
-};
-template <>
-struct Element<uint8_t> {
-    static constexpr int32_t typeCode = QXTypeU8;
-    typedef U8_1D Handle1D;
-    typedef Array2DHandle Handle2D;
-};
-template <>
-struct Element<uint32_t> {
-    static constexpr int32_t typeCode = QXTypeU32;
-    typedef U32_1D Handle1D;
-    typedef Array2DHandle Handle2D;
-};
-template <>
-struct Element<float> {
-    static constexpr int32_t typeCode = QXTypeSGL;
-    typedef SGL1D Handle1D;
-    typedef Array2DHandle Handle2D;
-};
-template <>
-struct Element<double> {
-    static constexpr int32_t typeCode = QXTypeDBL;
-    typedef DBL1D Handle1D;
-    typedef DBL2D Handle2D;
-};
-template <>
-struct Element<std::complex<float>> {
-    static constexpr int32_t typeCode = QXTypeCSG;
-    typedef CSG1D Handle1D;
-    typedef Array2DHandle Handle2D;
-};
-template <>
-struct Element<std::complex<double>> {
-    static constexpr int32_t typeCode = QXTypeCDB;
-    typedef CDB1D Handle1D;
-    typedef CDB2D Handle2D;
-};
 
 // An array of one dimension. The handle stays the same for the array's life, while pointers,
 // spans and references to elements hold until the next call that has the array as an output.
