@@ -16,6 +16,8 @@ ROOT = Path(__file__).resolve().parent
 BUILD = ROOT / "build"
 PROJECT = (ROOT / "CMakeLists.txt").read_text("utf-8")
 
+LIBRARIES = ("libqxanalysis.so", "libqxrt.so", "qxanalysis.dll", "qxrt.dll", "print_hashes", "hashes.txt")
+
 
 def libraries():
     """The folder of the built libraries: QX_LIBRARY_DIR, or the release build, made up to date."""
@@ -35,14 +37,20 @@ class WithLibraries(build_py):
             libraries()  # the package finds them in the tree
             return
         package = Path(self.build_lib) / "qx"
+        shutil.rmtree(package / "licences", ignore_errors=True)  # and what a wheel for another system has left
+        for name in LIBRARIES:
+            (package / name).unlink(missing_ok=True)
         ending = "dll" if (libraries() / "qxrt.dll").exists() else "so"
-        prefix = "" if ending == "dll" else "lib"
-        for name in (f"{prefix}qxanalysis.{ending}", f"{prefix}qxrt.{ending}", "catalogue.json"):
-            shutil.copy(libraries() / name, package)
+        # What is given to others has the hashes of the results, too (tools/package).
+        with_hashes = (libraries() / "hashes.txt").exists()
+        for name in LIBRARIES if with_hashes else LIBRARIES[:4]:
+            if (libraries() / name).exists():
+                shutil.copy(libraries() / name, package)
+        shutil.copy(libraries() / "catalogue.json", package)
         shutil.copytree(libraries() / "licences", package / "licences", dirs_exist_ok=True)
         subprocess.run([sys.executable, "-m", "qx.stubs", package], check=True,
                        env={**os.environ, "PYTHONPATH": os.pathsep.join(
-                           [self.build_lib, *filter(None, sys.path)]), 
+                           [self.build_lib, *filter(None, sys.path)]),
                             # Libraries of another system cannot be loaded here.
                             "QX_LIBRARY_DIR": str(BUILD / "release") if ending == "dll" else ""})
 

@@ -4,9 +4,11 @@
 """
 
 import os
+import re
 import shutil
 import subprocess
 import sys
+import tarfile
 import tempfile
 import unittest
 import zipfile
@@ -48,7 +50,7 @@ def run(*command, **more):
     """The output of a command; a failure shows all of it."""
     ran = subprocess.run([str(part) for part in command], text=True, stdout=subprocess.PIPE,
                          stderr=subprocess.STDOUT, **more)
-    if ran.returncode != more.get("status", 0):
+    if ran.returncode:
         raise AssertionError(f"{' '.join(map(str, command))}\n{ran.stdout[-3000:]}")
     return ran.stdout
 
@@ -101,6 +103,129 @@ class Windows(InAFolder):
             names = set(wheel.namelist())
         self.assertLessEqual({"qx/qxanalysis.dll", "qx/qxrt.dll", "qx/catalogue.json", "qx/exports.pyi"}, names)
         self.assertFalse([name for name in names if name.endswith(".so")])
+
+
+THROWS = """
+#include <cstdio>
+#include <stdexcept>
+#include <string>
+static void f(int n) { std::string s(40, 'x'); if (n == 0) throw std::runtime_error("caught"); f(n - 1); }
+int main() { try { f(9); } catch (const std::exception &e) { std::puts(e.what()); } }
+"""
+
+
+MEAN = """
+import ctypes
+host, module = (ctypes.CDLL("/opt/qx/qx/" + name) for name in ("libqxrt.so", "libqxanalysis.so"))
+host.QXHostCopy1D.restype = ctypes.c_void_p
+x = ctypes.c_void_p(host.QXHostCopy1D(10, 3, (ctypes.c_double * 3)(1, 2, 6)))
+mean, err = ctypes.c_double(), ctypes.c_int(1)
+module.Mean_head(x, ctypes.byref(mean), ctypes.byref(err))
+print(mean.value, err.value)
+"""
+
+
+def unpacked(wheel, folder):
+    """As pip does it, with the marks of what can be run."""
+    with zipfile.ZipFile(wheel) as archive:
+        for entry in archive.infolist():
+            path = Path(archive.extract(entry, folder))
+            if entry.external_attr >> 16 & 0o100:
+                path.chmod(0o755)
+
+
+def made_wheel():
+    return Path(run(SOURCE / "tools/package", "wheel").strip())
+
+
+@unittest.skipUnless(ALL, "links the libraries anew: ./test --all")
+class Wheel(InAFolder):
+    def test_it_is_verified_where_it_is_installed(self):
+        wheel = made_wheel()
+        version = re.search(r"-py3-none-manylinux_2_(\d+)_x86_64\.whl$", wheel.name)
+        self.assertLessEqual(int(version[1]), 17)
+        unpacked(wheel, self.folder)
+        environment = {**os.environ, "PYTHONPATH": str(self.folder)}
+        environment.pop("QX_LIBRARY_DIR", None)
+        shown = run("/usr/bin/python3", "-m", "qx", "verify", env=environment, cwd="/")
+        published = (SOURCE / "tests/conformance/hashes.txt").read_text("utf-8").splitlines()
+        self.assertIn(f"{len(published)} of {len(published)} exports give the published bits", shown)
+        # A bit that differs is told.
+        hashes = self.folder / "qx/hashes.txt"
+        hashes.write_text(hashes.read_text("utf-8").replace("Mean_head ", "Mean_head 0", 1), "utf-8")
+        ran = subprocess.run(["/usr/bin/python3", "-m", "qx", "verify"], env=environment, capture_output=True, text=True)
+        self.assertEqual(ran.returncode, 2)
+        self.assertRegex(ran.stdout, "^Mean_head: ")
+        self.assertIn("1 exports give other results", ran.stderr)
+
+    def test_exceptions_are_caught_without_help_of_the_c_library(self):
+        (self.folder / "throws.cpp").write_text(THROWS, "utf-8")
+        wrapped = ",".join(f"--wrap={name}" for name in ("dlopen", "dlsym", "dladdr1", "dlinfo", "pthread_once",
+                                                         "__pthread_key_create"))
+        run("g++", "-std=c++20", "throws.cpp", SOURCE / "src/frame/portable_linux.cpp", "-static-libstdc++",
+            "-static-libgcc", "-Wl,--gc-sections", f"-Wl,{wrapped}", "-o", "throws", cwd=self.folder)
+        self.assertEqual(run(self.folder / "throws"), "caught\n")
+        self.assertNotRegex(run("objdump", "-T", self.folder / "throws"), "_dl_find_object.*GLIBC")
+
+
+@unittest.skipUnless("QX_TEST_OTHER_DEBIAN" in os.environ, "needs a network and minutes: QX_TEST_OTHER_DEBIAN=1")
+class OtherDebian(InAFolder):
+    """The wheel where nothing but Python and NumPy is installed, and the Debian package."""
+
+    def root_of(self, release):
+        made = subprocess.run([SOURCE / "tools/setup/other-root", release], stdout=subprocess.PIPE, text=True)
+        if made.returncode == 77:
+            self.skipTest(f"a root of {release} cannot be made here")
+        self.assertEqual(made.returncode, 0)
+        return Path(made.stdout.strip())
+
+    def inside(self, root, command):
+        return run("chroot", root, "/usr/bin/env", "-i", "PATH=/usr/sbin:/usr/bin:/sbin:/bin", "sh", "-ec", command)
+
+    def with_wheel(self, root):
+        place = root / "opt/qx"
+        shutil.rmtree(place, ignore_errors=True)
+        unpacked(made_wheel(), place)
+
+    def test_wheel_on_the_next_release(self):
+        root = self.root_of("trixie")
+        self.with_wheel(root)
+        shown = self.inside(root, """cd / && export PYTHONPATH=/opt/qx
+            python3 -c 'import qx; print(qx.stats.mean([1.0, 3.0]), qx.linalg.solve([[2, 1], [1, 3]], [3, 5]))'
+            python3 -m qx verify""")
+        self.assertRegex(shown, r"^2\.0 \[0\.8 1\.4\]\n(\d+) of \1 exports give the published bits")
+
+    def test_libraries_on_the_release_before(self):
+        # Its NumPy is older than the package needs: the libraries alone.
+        root = self.root_of("bullseye")
+        self.with_wheel(root)
+        self.assertEqual(self.inside(root, f"python3 -c '{MEAN}'"), "3.0 0\n")
+
+    def test_debian_package(self):
+        run(SOURCE / "tools/package", "deb")
+        root = self.root_of("trixie")
+        package = next(PACKAGES.glob("qxanalysis_*.deb"))
+        shutil.copy(package, root / "opt")
+        shutil.copy("/etc/resolv.conf", root / "etc/resolv.conf")
+        self.inside(root, f"DEBIAN_FRONTEND=noninteractive apt-get install -y --no-install-recommends /opt/{package.name}")
+        self.addCleanup(self.inside, root, "dpkg -P qxanalysis")
+        shown = self.inside(root, """cd / && python3 -c 'import qx; print(qx.stats.mean([1.0, 3.0]), qx.__version__)'
+            ls /usr/include/qx/qx.hpp /usr/include/qx/qx.h /usr/lib/*/pkgconfig/qxanalysis.pc
+            ls /usr/share/doc/qxanalysis/licences/NOTICE.md /usr/share/doc/qxanalysis/README.md""")
+        self.assertRegex(shown, r"^2\.0 \d")
+
+
+@unittest.skipUnless(ALL, "builds from the archive: ./test --all")
+class Source(InAFolder):
+    def test_it_has_what_a_build_needs(self):
+        archives = [Path(run(SOURCE / "tools/package", "source").strip()).read_bytes() for _ in range(2)]
+        self.assertEqual(*archives, "the same files give the same archive")
+        archive = next(PACKAGES.glob("*.tar.gz"))
+        with tarfile.open(archive) as tar:
+            tar.extractall(self.folder)
+        place = next(self.folder.iterdir())
+        run("cmake", "--preset", "release", "-DQX_TESTS=OFF", cwd=place)
+        run("cmake", "--build", "build/release", "--target", "qxrt", cwd=place)
 
 
 if __name__ == "__main__":

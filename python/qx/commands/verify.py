@@ -1,0 +1,52 @@
+"""verify: whether the library gives here the bits that were published."""
+
+import subprocess
+import sys
+
+EPILOG = """\
+Every export is called with the arguments of its recipes, and a hash of all results is compared with the one
+that was published with this version. It takes some seconds. The status is 0 where all agree.
+
+examples:
+  python3 -m qx verify
+  QX_WIDTH=2 python3 -m qx verify      # as on a processor without AVX2"""
+
+PROGRAM, PUBLISHED = "print_hashes", "hashes.txt"
+
+
+def add(commands):
+    import argparse
+    command = commands.add_parser("verify", help="compare the results of all exports with the published ones",
+                                  description=__doc__, epilog=EPILOG,
+                                  formatter_class=argparse.RawDescriptionHelpFormatter)
+    command.set_defaults(run=verify)
+
+
+def _files():
+    """The program that prints the hashes, and those that were published: both beside the libraries, or in
+    the tree."""
+    from ..library import library
+    folder = library().folder
+    for published in (folder / PUBLISHED, folder.parent.parent / "tests/conformance" / PUBLISHED):
+        if published.exists() and (folder / PROGRAM).exists():
+            return folder / PROGRAM, published
+    raise LookupError(f"{PROGRAM} and {PUBLISHED} are not beside the libraries in {folder}: a wheel has them "
+                      "(tools/package wheel), and in the tree cmake --build build/release --target print_hashes")
+
+
+def verify(options):
+    program, published = _files()
+    due = dict(line.split() for line in published.read_text("utf-8").splitlines())
+    ran = subprocess.run([program], capture_output=True, text=True)
+    if ran.returncode:
+        raise RuntimeError(f"{program} ended with {ran.returncode}: {ran.stderr.strip()[-500:]}")
+    found = {line.split()[1]: line.split()[0] for line in ran.stdout.splitlines()}
+    differing = sorted(name for name, value in due.items() if found.get(name) != value)
+    for name in differing:
+        print(f"{name}: {found.get(name, 'no result')}, published {due[name]}")
+    others = len(found.keys() - due.keys())
+    print(f"{len(due) - len(differing)} of {len(due)} exports give the published bits here"
+          + (f"; of {others} more the last bits depend on the processor" if others else "") + ".")
+    if differing:
+        sys.stdout.flush()
+        raise ValueError(f"{len(differing)} exports give other results than those published")
