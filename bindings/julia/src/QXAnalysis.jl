@@ -1,0 +1,38 @@
+"""
+The exports of the QX analysis library as they are in C, and the stand-in host that makes their arrays.
+
+An array is a handle, a pointer to the pointer to a block: the sizes, then the elements. Numbers that an export
+writes are given as a `Ref`. 0 is success, a negative code a failure, a positive one a warning.
+"""
+module QXAnalysis
+
+using Libdl
+
+const folder = get(ENV, "QX_LIBRARY_DIR", "")
+const libqxrt = joinpath(folder, "libqxrt")
+const libqxanalysis = joinpath(folder, "libqxanalysis")
+const DBL, CDB, INT = Int32(10), Int32(13), Int32(3)
+
+# The module looks for its host among the libraries of the process, when it is loaded.
+__init__() = dlopen(libqxrt)
+
+"An array of numbers, which is given back by `release`."
+array(x::Vector{Float64}) =
+    ccall((:QXHostCopy1D, libqxrt), Ptr{Cvoid}, (Int32, Int32, Ptr{Float64}), DBL, length(x), x)
+release(handle) = ccall((:QXHostFree, libqxrt), Cvoid, (Ptr{Cvoid},), handle)
+
+"The elements of an array of numbers of one dimension."
+function elements(handle)
+    block = unsafe_load(Ptr{Ptr{Int32}}(handle))
+    count = unsafe_load(block)
+    found = Vector{Float64}(undef, count)
+    GC.@preserve found unsafe_copyto!(Ptr{UInt8}(pointer(found)), Ptr{UInt8}(block) + 4, 8 * count)
+    found
+end
+
+error_name(code) = unsafe_string(ccall((:QXHostErrorName, libqxrt), Cstring, (Int32,), code))
+error_text(code) = unsafe_string(ccall((:QXHostErrorText, libqxrt), Cstring, (Int32,), code))
+
+include("exports.jl")
+
+end

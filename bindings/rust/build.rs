@@ -1,0 +1,7 @@
+// The folder of libqxanalysis.so and libqxrt.so, where that is none of the linker's own.
+fn main() {
+    println!("cargo:rerun-if-env-changed=QX_LIBRARY_DIR");
+    if let Ok(folder) = std::env::var("QX_LIBRARY_DIR") {
+        println!("cargo:rustc-link-search=native={folder}");
+    }
+}
