@@ -20,7 +20,7 @@ function(qx_portable name)
         -Wl,--wrap=pthread_once,--wrap=__pthread_key_create)
     target_link_libraries(${name} PRIVATE -Wl,--no-as-needed ${QX_ELDER_LIBRARIES} -Wl,--as-needed)
     set_target_properties(${name} PROPERTIES LIBRARY_OUTPUT_DIRECTORY ${QX_PORTABLE}
-        RUNTIME_OUTPUT_DIRECTORY ${QX_PORTABLE} BUILD_RPATH \$ORIGIN BUILD_WITH_INSTALL_RPATH OFF)
+        RUNTIME_OUTPUT_DIRECTORY ${QX_PORTABLE} INSTALL_RPATH \$ORIGIN BUILD_WITH_INSTALL_RPATH ON)
 endfunction()
 
 add_library(qxanalysis_portable SHARED EXCLUDE_FROM_ALL $<TARGET_OBJECTS:qxanalysis>)

@@ -57,7 +57,8 @@ class WithoutAttributes(unittest.TestCase):
             for processor in PROCESSORS:
                 with self.subTest(processor):
                     layouts = [re.findall(r"^@(of_\w+) = .*?(?:\[(i32 .*)\]|(zeroinitializer))", text, re.MULTILINE)
-                               for text in (compiled(f"{processor}-{system}", [source], "-S", "-emit-llvm", "-o", "-", *options)
+                               for text in (compiled(f"{processor}-{system}", [source], "-S", "-emit-llvm", "-o", "-",
+                                                     *options)
                                             for system, options in (("w64-windows-gnu", ()),
                                                                     ("pc-windows-msvc", NO_ATTRIBUTES)))]
                     self.assertIn(("of_WorkspaceStatus", "i32 5, i32 1, i32 0, i32 1", ""), layouts[0])

@@ -145,6 +145,9 @@ class Wheel(InAFolder):
         version = re.search(r"-py3-none-manylinux_2_(\d+)_x86_64\.whl$", wheel.name)
         self.assertLessEqual(int(version[1]), 17)
         unpacked(wheel, self.folder)
+        for name in ("libqxanalysis.so", "libqxrt.so", "print_hashes"):
+            paths = re.findall(r"(?:RUNPATH|RPATH) +(\S+)", run("objdump", "-p", self.folder / "qx" / name))
+            self.assertEqual(paths, ["$ORIGIN"], name)
         environment = {**os.environ, "PYTHONPATH": str(self.folder)}
         environment.pop("QX_LIBRARY_DIR", None)
         shown = run("/usr/bin/python3", "-m", "qx", "verify", env=environment, cwd="/")

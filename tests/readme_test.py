@@ -64,7 +64,8 @@ AFTERWARDS = {
     "python3 -m venv": "(cd / && unset PYTHONPATH && ~/qx/bin/python3 -c 'import qx, sys;"
                        " assert qx.__file__.startswith(sys.prefix); assert qx.Mean_head([1.0, 3.0]) == 2.0')",
     "cc -Iinclude": "./a.out | grep '^2.33333 ('",
-    "c++ -std": "./a.out | grep ErrOrderNotPositive",
+    "c++ -std=c++20 -Iinclude -Ibuild/release/include examples/first_call": "./a.out | grep ErrOrderNotPositive",
+    "c++ -std=c++20 -Iinclude -Ibuild/release/include examples/ten_tasks": "./a.out >/dev/null",
     "cmake --install": "[ -f ~/qx-library/include/qx/qx.h ]",
     "cc first.c": "(cd / && \"$OLDPWD/first\" | grep '^2.33333 (')",
     "tools/site": "[ -s build/site/index.html ]",

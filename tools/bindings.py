@@ -20,11 +20,18 @@ WARNING = "Written by tools/bindings.py from the headers; see there for what is 
 # Records whose elements begin at any byte.
 UNALIGNED = {"DBL", "SGL", "I32", "U32", "CDB", "CSG"}
 
-KEYWORDS = {
-    "rust": {"in", "type", "ref", "where", "match", "fn", "mod", "use", "loop", "move", "box", "final", "priv", "do"},
-    "csharp": {"in", "out", "ref", "base", "fixed", "params", "object", "string", "lock", "event", "operator", "is", "as"},
-    "julia": {"end", "function", "begin", "for", "type", "in", "global", "local", "let", "const", "final"},
-}
+KEYWORDS = {language: set(words.split()) for language, words in {
+    "rust": """abstract as async await become box break const continue crate do dyn else enum extern false final fn for if
+        impl in let loop macro match mod move mut override priv pub ref return self static struct super trait true try
+        type typeof unsafe unsized use virtual where while yield""",
+    "csharp": """abstract as base bool break byte case catch char checked class const continue decimal default delegate do
+        double else enum event explicit extern false finally fixed float for foreach goto if implicit in int interface
+        internal is lock long namespace new null object operator out override params private protected public readonly
+        ref return sbyte sealed short sizeof stackalloc static string struct switch this throw true try typeof uint ulong
+        unchecked unsafe ushort using virtual void volatile while""",
+    "julia": """baremodule begin break catch ccall const continue do else elseif end export false finally for function global
+        if import in isa let local macro module quote return struct true try using where while""",
+}.items()}
 
 
 def is_unaligned(record):
@@ -140,7 +147,8 @@ def csharp_argument(catalogue, one):
 
 def csharp(catalogue):
     yield f"// {WARNING}\n\nusing System;\nusing System.Runtime.InteropServices;\n\nnamespace QX\n{{\n"
-    yield "    /// <summary>Negative codes are failures, positive ones warnings.</summary>\n    public static class Code\n    {\n"
+    yield "    /// <summary>Negative codes are failures, positive ones warnings.</summary>\n" \
+          "    public static class Code\n    {\n"
     for code, number in catalogue["codes"].items():
         yield f"        public const int {code} = {number};\n"
     yield "    }\n\n"
@@ -155,10 +163,11 @@ def csharp(catalogue):
             for i in range(count):
                 yield f"        public {base} {safe('csharp', field)}{i if count > 1 else ''};\n"
         yield "    }\n\n"
-    yield "    /// <summary>The exports. Arrays are handles, made by Host.</summary>\n    public static class Exports\n    {\n"
+    yield "    /// <summary>The exports. Arrays are handles, made by Host.</summary>\n" \
+          "    public static class Exports\n    {\n"
     for export in catalogue["exports"]:
-        yield "        /// <summary>\n" + "".join(
-            f"        /// {xml(line)}".rstrip() + "\n" for line in export["documentation"].split("\n")) + "        /// </summary>\n"
+        lines = ["<summary>", *xml(export["documentation"]).split("\n"), "</summary>"]
+        yield "".join(f"        /// {line}".rstrip() + "\n" for line in lines)
         arguments = ", ".join(csharp_argument(catalogue, one) for one in export["arguments"])
         returns = export["returns"]
         result = "void" if returns == "void" else CSHARP.get(returns, "IntPtr")

@@ -115,7 +115,8 @@ NAMES = {
     "y[i][j] =": "elements", "y = p[0] I": "matrix",
     "LU factorisation": "lu", "Cholesky factorisation": "cholesky", "singular values without": "rank_revealing",
     "lambda by": "cross_validation", "lambda is": "given_lambda", "the smoothest": "given_residual",
-    "(x[i+1] - x[i-1])": "central2", "(x[i-2] - 8": "central4", "(x[i+1] - x[i]) /": "forward", "(x[i] - x[i-1]) /": "backward",
+    "(x[i+1] - x[i-1])": "central2", "(x[i-2] - 8": "central4", "(x[i+1] - x[i]) /": "forward",
+    "(x[i] - x[i-1]) /": "backward",
     "the automatic method takes": "both_or_neither", "by falling amp": "amplitude", "by rising freq": "frequency",
 }
 # Of choices that their header names elsewhere.
@@ -252,12 +253,13 @@ def blames(export, names):
     sentence = re.search(r"\bCodes:(.*)", " ".join(export["text"].split()))
     found = {}
     for code, reason in re.findall(r"((?:Err|Warn)\w+) \(((?:[^()]|\([^()]*\))*)\)", sentence[1] if sentence else ""):
-        named = [word for word in re.findall(r"\w+", reason) if word in names]
+        words = re.findall(r"\w+", reason)
+        named = [word for word in words if word in names]
         if code in found or not named:
             found[code] = None
         else:
-            found[code] = named[0] if len(set(named)) == 1 or named[0] == re.findall(r"\w+", reason)[0] and " or " not in reason \
-                else None
+            is_first = named[0] == words[0] and "or" not in words
+            found[code] = named[0] if len(set(named)) == 1 or is_first else None
     return {code: name for code, name in found.items() if name and code.startswith("Err")}
 
 
@@ -348,7 +350,8 @@ class Function:
                 value = None
             lines.append(one.declared(value))
         lines.append("ResultType result{};" if not into else "ResultType result = place.elements;")
-        lines.append("if (!call.ready())\n        return call.with(" + ("ResultType{}" if into else "std::move(result)") + ");")
+        nothing = "ResultType{}" if into else "std::move(result)"
+        lines.append(f"if (!call.ready())\n        return call.with({nothing});")
         lines.append(self.call({one.name: one.handed for one in self.arguments}).rstrip())
         lines.append(self.ended())
         for one in self.outputs:
@@ -370,14 +373,15 @@ class Function:
         parameters = self.parameters()
         rest = f", {parameters}" if parameters else ""
         made = [self.record(), self.documentation(),
-                f"inline Returned<{result}> {name}(Returning{rest}) {{\n    typedef {result} ResultType;\n    {self.body(False)}\n}}\n",
+                f"inline Returned<{result}> {name}(Returning{rest}) {{\n"
+                f"    typedef {result} ResultType;\n    {self.body(False)}\n}}\n",
                 f"inline {result} {name}({parameters}) {{ return {self.topic.name}::{name}(returned{names}).value(); }}\n"]
         if len(self.outputs) == 1 and self.outputs[0].is_array:
             kind = self.outputs[0].type
             made += [f"inline Returned<std::span<{kind}>> {name}(Returning, Into<{kind}> place{rest}) {{\n"
                      f"    typedef std::span<{kind}> ResultType;\n    {self.body(True)}\n}}\n",
-                     f"inline std::span<{kind}> {name}(Into<{kind}> place{rest}) {{\n    return {self.topic.name}::{name}(returned, place"
-                     f"{names}).value();\n}}\n"]
+                     f"inline std::span<{kind}> {name}(Into<{kind}> place{rest}) {{\n"
+                     f"    return {self.topic.name}::{name}(returned, place{names}).value();\n}}\n"]
         return "".join(made)
 
     # Streams
@@ -387,7 +391,7 @@ class Function:
         y = self.outputs[0]
         fixed = [one for one in self.inputs if one is not x]
         kept = [self.by_name[name] for name in self.kept]
-        members, making, handed = [], [], {x.name: "x_.handle()", y.name: "x_.handle()" if y is x else "y_.handle()"}
+        members, making, reserving, handed = [], [], [], {x.name: "x_.handle()", y.name: "x_.handle()" if y is x else "y_.handle()"}
         for one in fixed:
             if one.is_array:
                 members.append(f"{one.owner} {one.name}_;")
@@ -415,9 +419,10 @@ class Function:
             flags.append(f"const {kind} {name}_ = begun_ ? {kind}{{{later}}} : {kind}{{{first}}};")
             handed[name] = one.handed
         reset = "".join(f"        {one.name}_ = {{}};\n" for one in kept if not one.is_array)
-        making += [f"x_ = detail::Array1<{x.type}>(call);"] + \
-                  ([] if y is x else [f"y_ = detail::Array1<{y.type}>(call);"])
-        members += [f"detail::Array1<{x.type}> x_;"] + ([] if y is x else [f"detail::Array1<{y.type}> y_;"])
+        for name, one in [("x_", x)] + [("y_", y)] * (y is not x):
+            making.append(f"{name} = detail::Array1<{one.type}>(call);")
+            members.append(f"detail::Array1<{one.type}> {name};")
+            reserving.append(f"        if (call.ready())\n            {name}.reserve(call, longest);\n")
         parameters = self.parameters(of=fixed)
         made = "\n        ".join(making)
         flag_lines = "".join(f"        {line}\n" for line in flags)
@@ -435,9 +440,7 @@ public:
     explicit {self.stream}({parameters}{', ' if parameters else ''}std::size_t longest = 0) {{
         detail::Call call("{place}");
         {made}
-        if (call.ready())
-            x_.reserve(call, longest);
-{'' if y is x else '        if (call.ready())' + chr(10) + '            y_.reserve(call, longest);' + chr(10)}        made_ = call.status();
+{''.join(reserving)}        made_ = call.status();
     }}
 
     // The next block, and the part of `out` that it fills. `out` may be the block itself.
@@ -511,7 +514,8 @@ def text(catalogue):
     for name, keys in table().items():
         topic, written = Topic(name), []
         for key, export in keys.items():
-            base = next((key[:-len(ending)] for ending in ENDINGS if key.endswith(ending) and key[:-len(ending)] in keys), key)
+            base = next((key[:-len(ending)] for ending in ENDINGS
+                         if key.endswith(ending) and key[:-len(ending)] in keys), key)
             try:
                 function = Function(topic, key, base, by_name[export])
                 written.append(function.text())

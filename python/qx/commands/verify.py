@@ -1,5 +1,6 @@
 """verify: whether the library gives here the bits that were published."""
 
+import os
 import subprocess
 import sys
 
@@ -37,7 +38,9 @@ def _files():
 def verify(options):
     program, published = _files()
     due = dict(line.split() for line in published.read_text("utf-8").splitlines())
-    ran = subprocess.run([program], capture_output=True, text=True)
+    # Where there is no /proc the program cannot find what lies beside it.
+    ran = subprocess.run([program], capture_output=True, text=True,
+                         env={**os.environ, "LD_LIBRARY_PATH": str(program.parent)})
     if ran.returncode:
         raise RuntimeError(f"{program} ended with {ran.returncode}: {ran.stderr.strip()[-500:]}")
     found = {line.split()[1]: line.split()[0] for line in ran.stdout.splitlines()}
