@@ -391,7 +391,8 @@ class Function:
         y = self.outputs[0]
         fixed = [one for one in self.inputs if one is not x]
         kept = [self.by_name[name] for name in self.kept]
-        members, making, reserving, handed = [], [], [], {x.name: "x_.handle()", y.name: "x_.handle()" if y is x else "y_.handle()"}
+        members, making, reserving = [], [], []
+        handed = {x.name: "x_.handle()", y.name: "x_.handle()" if y is x else "y_.handle()"}
         for one in fixed:
             if one.is_array:
                 members.append(f"{one.owner} {one.name}_;")
