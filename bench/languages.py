@@ -75,7 +75,10 @@ fn main() {
         let start = Instant::now();
         for _ in 0..CALLS { unsafe { Mean_head(x, &mut mean, &mut err); } }
         let between = Instant::now();
-        for _ in 0..CALLS { unsafe { let made = array(&values); Mean_head(made, &mut mean, &mut err); QXHostFree(made.cast()); } }
+        for _ in 0..CALLS {
+            let made = array(&values);
+            unsafe { Mean_head(made, &mut mean, &mut err); QXHostFree(made.cast()); }
+        }
         best[0] = best[0].min((between - start).as_secs_f64() / CALLS as f64);
         best[1] = best[1].min(between.elapsed().as_secs_f64() / CALLS as f64);
     }
