@@ -1,2 +1,3 @@
 qx_bench(linalg_factorisations SOURCES linalg_factorisations.cpp)
 target_include_directories(bench_linalg_factorisations PRIVATE ${QX_LAPACK_HEADERS})
+target_link_libraries(bench_linalg_factorisations PRIVATE ${CMAKE_DL_LIBS})

@@ -1,10 +1,11 @@
-// Singular values, eigenproblems and factorisations against LAPACK as the module carries it.
+// Singular values, eigenproblems and factorisations against the LAPACK of OpenBLAS
+// (bench/peer_lapack.h).
 //
 // bench_linalg_factorisations [GROUP...]: svd, values, symmetric, general, qr, cholesky; all by
 // default.
 
+#include "bench/peer_lapack.h"
 #include "bench/timing.h"
-#include "linalg/blas_memory.h"
 #include "linalg/eigenproblems/general.h"
 #include "linalg/eigenproblems/symmetric.h"
 #include "linalg/factorisations/cholesky.h"
@@ -75,6 +76,7 @@ constexpr auto Real = qx::ElementType::DBL;
 const std::vector<int32_t> orders = {2, 4, 8, 16, 50, 100, 200, 500};
 
 void SingularValueDecomposition(bool withVectors) {
+    const auto dgesvd = qx::bench::PeerRoutine<decltype(dgesvd_)>("dgesvd_");
     Ratios ratios(withVectors ? "singular value decompositions" : "singular values");
     for (const int32_t n : orders) {
         const std::vector<double> a = Random(n);
@@ -82,8 +84,8 @@ void SingularValueDecomposition(bool withVectors) {
         const char job = withVectors ? 'S' : 'N';
         const auto driver = [&](double *work, int32_t length) {
             int32_t info;
-            LAPACK_dgesvd(&job, &job, &n, &n, copy.data(), &n, s.data(), u.data(), &n, v.data(), &n,
-                          work, &length, &info);
+            dgesvd(&job, &job, &n, &n, copy.data(), &n, s.data(), u.data(), &n, v.data(), &n,
+                          work, &length, &info, 1, 1);
         };
         copy = a;
         std::vector<double> work = WorkFor(driver);
@@ -105,13 +107,14 @@ void SingularValueDecomposition(bool withVectors) {
 }
 
 void SymmetricEigenproblem() {
+    const auto dsyev = qx::bench::PeerRoutine<decltype(dsyev_)>("dsyev_");
     Ratios ratios("symmetric eigenproblems");
     for (const int32_t n : orders) {
         const std::vector<double> a = Symmetric(n, 0.0);
         std::vector<double> w(n), v(a.size()), copy = a;
         const auto driver = [&](double *work, int32_t length) {
             int32_t info;
-            LAPACK_dsyev("V", "L", &n, copy.data(), &n, w.data(), work, &length, &info);
+            dsyev("V", "L", &n, copy.data(), &n, w.data(), work, &length, &info, 1, 1);
         };
         std::vector<double> work = WorkFor(driver);
         Compare(
@@ -128,6 +131,7 @@ void SymmetricEigenproblem() {
 }
 
 void GeneralEigenproblem() {
+    const auto dgeev = qx::bench::PeerRoutine<decltype(dgeev_)>("dgeev_");
     Ratios ratios("general eigenproblems");
     for (const int32_t n : orders) {
         const std::vector<double> a = Random(n);
@@ -135,8 +139,8 @@ void GeneralEigenproblem() {
         std::vector<double> re(n), im(n), v(a.size()), copy = a;
         const auto driver = [&](double *work, int32_t length) {
             int32_t info;
-            LAPACK_dgeev("N", "V", &n, copy.data(), &n, re.data(), im.data(), nullptr, &n, v.data(),
-                         &n, work, &length, &info);
+            dgeev("N", "V", &n, copy.data(), &n, re.data(), im.data(), nullptr, &n, v.data(),
+                         &n, work, &length, &info, 1, 1);
         };
         std::vector<double> work = WorkFor(driver);
         Compare(
@@ -153,17 +157,19 @@ void GeneralEigenproblem() {
 }
 
 void QR() {
+    const auto dgeqrf = qx::bench::PeerRoutine<decltype(dgeqrf_)>("dgeqrf_");
+    const auto dorgqr = qx::bench::PeerRoutine<decltype(dorgqr_)>("dorgqr_");
     Ratios ratios("QR factorisations with all of q");
     for (const int32_t n : orders) {
         const std::vector<double> a = Random(n);
         std::vector<double> q(a.size()), r(a.size()), tau(n), copy = a;
         const auto factor = [&](double *work, int32_t length) {
             int32_t info;
-            LAPACK_dgeqrf(&n, &n, copy.data(), &n, tau.data(), work, &length, &info);
+            dgeqrf(&n, &n, copy.data(), &n, tau.data(), work, &length, &info);
         };
         const auto form = [&](double *work, int32_t length) {
             int32_t info;
-            LAPACK_dorgqr(&n, &n, &n, copy.data(), &n, tau.data(), work, &length, &info);
+            dorgqr(&n, &n, &n, copy.data(), &n, tau.data(), work, &length, &info);
         };
         std::vector<double> work = WorkFor(factor), formWork = WorkFor(form);
         Compare(
@@ -182,6 +188,7 @@ void QR() {
 }
 
 void Cholesky() {
+    const auto dpotrf = qx::bench::PeerRoutine<decltype(dpotrf_)>("dpotrf_");
     Ratios ratios("Cholesky factorisations");
     for (const int32_t n : orders) {
         const std::vector<double> a = Symmetric(n, n);
@@ -198,7 +205,7 @@ void Cholesky() {
             [&] {
                 copy = a;
                 int32_t info;
-                LAPACK_dpotrf("L", &n, copy.data(), &n, &info);
+                dpotrf("L", &n, copy.data(), &n, &info, 1);
             });
     }
     ratios.summary("dpotrf");
@@ -207,7 +214,6 @@ void Cholesky() {
 } // namespace
 
 int main(int argc, char **argv) {
-    const qx::BlasMemory memory;
     const std::pair<const char *, void (*)()> groups[] = {
         {"svd", [] { SingularValueDecomposition(true); }},
         {"values", [] { SingularValueDecomposition(false); }},

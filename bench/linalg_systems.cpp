@@ -1,11 +1,11 @@
-// Products, LU solves and inverses against BLAS and LAPACK, both as the module carries them, so
-// that the same kernels stand behind either side. And what an export adds to its inner routine.
+// Products, LU solves and inverses against OpenBLAS and its LAPACK (bench/peer_lapack.h). And what
+// an export adds to its inner routine.
 //
-// bench_linalg_systems [GROUP...]: products, ordered, small, solve, complex, inverse,
+// bench_linalg_systems [GROUP...]: products, tiny, complexproducts, small, solve, complex, inverse,
 // frame; all by default.
 
+#include "bench/peer_lapack.h"
 #include "bench/timing.h"
-#include "linalg/blas_memory.h"
 #include "linalg/products/products.h"
 #include "linalg/systems/lu.h"
 #include "qx/host.hpp"
@@ -13,7 +13,6 @@
 
 #define lapack_complex_float CSG
 #define lapack_complex_double CDB
-#include <cblas.h>
 #include <lapack.h>
 
 #include <algorithm>
@@ -63,60 +62,53 @@ void Compare(Ratios &ratios, const char *name, int32_t n, const Ours &ours, cons
 
 constexpr auto Real = qx::ElementType::DBL;
 
-void Products() {
-    Ratios ratios("matrix products of 64 and up");
-    for (const int32_t n : {64, 100, 200, 500, 1000}) {
-        const auto a = Random(static_cast<std::size_t>(n) * n);
-        std::vector<double> c(a.size());
-        Compare(
-            ratios, "product", n,
-            [&] {
-                qx::MatrixProduct<Real>({a.data(), n, n}, {a.data(), n, n}, {c.data(), n, n});
-            },
-            [&] {
-                cblas_dgemm(CblasRowMajor, CblasNoTrans, CblasNoTrans, n, n, n, 1.0, a.data(), n,
-                            a.data(), n, 0.0, c.data(), n);
-            });
-    }
-    ratios.summary("cblas_dgemm");
-}
-
-// The product that keeps the order of its sums, at every size.
-void Ordered() {
-    Ratios ratios("matrix products in a stated order");
-    for (const int32_t n : {2, 4, 8, 16, 32, 64, 200, 500}) {
-        const auto a = Random(static_cast<std::size_t>(n) * n);
-        std::vector<double> c(a.size());
-        Compare(
-            ratios, "ordered product", n,
-            [&] {
-                qx::OrderedProduct<Real>({a.data(), n, n}, {a.data(), n, n}, {c.data(), n, n});
-            },
-            [&] {
-                cblas_dgemm(CblasRowMajor, CblasNoTrans, CblasNoTrans, n, n, n, 1.0, a.data(), n,
-                            a.data(), n, 0.0, c.data(), n);
-            });
-    }
-    ratios.summary("cblas_dgemm");
-}
-
-void SolveByLapack(int32_t n, double *a, int32_t *pivots, double *x) {
-    const int32_t one = 1;
-    int32_t info;
-    LAPACK_dgesv(&n, &one, a, &n, pivots, x, &n, &info);
-}
-void SolveByLapack(int32_t n, CDB *a, int32_t *pivots, CDB *x) {
-    const int32_t one = 1;
-    int32_t info;
-    LAPACK_zgesv(&n, &one, a, &n, pivots, x, &n, &info);
-}
-
 template <class T>
 std::vector<T> RandomOf(std::size_t count) {
     const std::vector<double> numbers = Random(count * (sizeof(T) / sizeof(double)));
     std::vector<T> x(count);
     std::memcpy(x.data(), numbers.data(), count * sizeof(T));
     return x;
+}
+
+template <class T>
+using Gemm = void(const char *, const char *, const int32_t *, const int32_t *, const int32_t *,
+                  const T *, const T *, const int32_t *, const T *, const int32_t *, const T *, T *,
+                  const int32_t *, std::size_t, std::size_t);
+
+template <qx::ElementType E>
+void Products(const char *name, const char *peer, const char *routine,
+              std::initializer_list<int32_t> sizes) {
+    typedef qx::ElementOf<E> T;
+    Gemm<T> *const gemm = qx::bench::PeerRoutine<Gemm<T>>(routine);
+    Ratios ratios(name);
+    for (const int32_t n : sizes) {
+        const auto a = RandomOf<T>(static_cast<std::size_t>(n) * n);
+        std::vector<T> c(a.size());
+        const T one = qx::ScalarOf<E>::Of(1.0), zero = qx::ScalarOf<E>::Of(0.0);
+        Compare(
+            ratios, E == Real ? "product" : "complex product", n,
+            [&] {
+                qx::MatrixProduct<E>({a.data(), n, n}, {a.data(), n, n}, {c.data(), n, n});
+            },
+            [&] {
+                gemm("N", "N", &n, &n, &n, &one, a.data(), &n, a.data(), &n, &zero, c.data(), &n, 1,
+                     1);
+            });
+    }
+    ratios.summary(peer);
+}
+
+void SolveByLapack(int32_t n, double *a, int32_t *pivots, double *x) {
+    const int32_t one = 1;
+    int32_t info;
+    static const auto dgesv = qx::bench::PeerRoutine<decltype(dgesv_)>("dgesv_");
+    dgesv(&n, &one, a, &n, pivots, x, &n, &info);
+}
+void SolveByLapack(int32_t n, CDB *a, int32_t *pivots, CDB *x) {
+    const int32_t one = 1;
+    int32_t info;
+    static const auto zgesv = qx::bench::PeerRoutine<decltype(zgesv_)>("zgesv_");
+    zgesv(&n, &one, a, &n, pivots, x, &n, &info);
 }
 
 template <qx::ElementType E>
@@ -142,6 +134,7 @@ void Solve(const char *name, const char *peer, std::initializer_list<int32_t> si
 }
 
 void Inverse() {
+    const auto dgesv = qx::bench::PeerRoutine<decltype(dgesv_)>("dgesv_");
     Ratios ratios("inverses");
     for (const int32_t n : {4, 8, 32, 100, 300}) {
         const auto a = Random(static_cast<std::size_t>(n) * n);
@@ -158,7 +151,7 @@ void Inverse() {
                 std::fill(other.begin(), other.end(), 0.0);
                 for (int32_t i = 0; i < n; ++i)
                     other[static_cast<std::size_t>(i) * (n + 1)] = 1.0;
-                LAPACK_dgesv(&n, &n, factors.data(), &n, pivots.data(), other.data(), &n, &info);
+                dgesv(&n, &n, factors.data(), &n, pivots.data(), other.data(), &n, &info);
             });
     }
     ratios.summary("LAPACK dgesv on the unit matrix");
@@ -183,16 +176,19 @@ void Frame() {
 } // namespace
 
 int main(int argc, char **argv) {
-    const qx::BlasMemory memory;
     const auto wanted = [&](const char *group) {
         return argc < 2 || std::any_of(argv + 1, argv + argc, [&](const char *argument) {
                    return std::strcmp(argument, group) == 0;
                });
     };
+    if (wanted("tiny"))
+        Products<Real>("matrix products of 2 to 32", "dgemm", "dgemm_", {2, 4, 8, 16, 32});
     if (wanted("products"))
-        Products();
-    if (wanted("ordered"))
-        Ordered();
+        Products<Real>("matrix products of 64 and up", "dgemm", "dgemm_",
+                       {64, 100, 150, 200, 300, 500, 1000, 2000});
+    if (wanted("complexproducts"))
+        Products<qx::ElementType::CDB>("complex matrix products of 64 and up", "zgemm", "zgemm_",
+                                       {64, 100, 200, 500, 1000});
     if (wanted("small"))
         Solve<Real>("linear systems up to 8 by 8", "LAPACK dgesv", {1, 2, 3, 4, 5, 6, 7, 8});
     if (wanted("solve"))
@@ -205,5 +201,4 @@ int main(int argc, char **argv) {
         Inverse();
     if (wanted("frame"))
         Frame();
-    return memory ? 0 : 1;
 }

@@ -1,4 +1,4 @@
-# The libraries that the module carries: the mathematics library, LAPACK and BLAS. ./setup builds them
+# The libraries that the module carries: the mathematics library, and LAPACK with its BLAS. ./setup builds them
 # from pinned sources with one compiler and one set of flags for every configuration of a target, so
 # that every export gives the same bits in all of them; here they are only looked for.
 if(WIN32)
@@ -14,7 +14,7 @@ file(GLOB recipes CONFIGURE_DEPENDS ${PROJECT_SOURCE_DIR}/tools/setup/*
 list(FILTER recipes EXCLUDE REGEX "/patches$")
 set_property(DIRECTORY APPEND PROPERTY CMAKE_CONFIGURE_DEPENDS ${recipes})
 
-foreach(library IN ITEMS libm lapack openblas)
+foreach(library IN ITEMS libm lapack)
     execute_process(COMMAND ${PROJECT_SOURCE_DIR}/tools/setup/${library} ${QX_SETUP_TARGET} find
         OUTPUT_VARIABLE archive OUTPUT_STRIP_TRAILING_WHITESPACE RESULT_VARIABLE missing)
     if(missing)
@@ -26,17 +26,15 @@ foreach(library IN ITEMS libm lapack openblas)
     set_target_properties(qx${library} PROPERTIES IMPORTED_LOCATION ${archive})
     set(QX_FOLDER_${library} ${folder})
 endforeach()
-# Of LAPACK and BLAS. One source and two benchmarks include them: no other compilation depends on where
-# they are.
+# Of LAPACK. One source includes it: no other compilation depends on where it is.
 set(QX_LAPACK_HEADERS ${QX_FOLDER_lapack}/include)
-# The core has what compiled Fortran asks for.
-target_link_libraries(qxlapack INTERFACE qxopenblas qxcore)
-target_link_libraries(qxopenblas INTERFACE qxlibm)
+# The core has what compiled Fortran asks for, and the routines of BLAS that are ours.
+target_link_libraries(qxlapack INTERFACE qxcore qxlibm)
 
 # Their licences, which are installed with the module (NOTICE.md): the name says of what.
 set(QX_LICENCES ${PROJECT_BINARY_DIR}/licences)
 file(REMOVE_RECURSE ${QX_LICENCES})
-foreach(pair IN ITEMS libm:musl lapack:lapack openblas:openblas)
+foreach(pair IN ITEMS libm:musl lapack:lapack)
     string(REGEX MATCH "(.*):(.*)" pair ${pair})
     file(GLOB texts ${QX_FOLDER_${CMAKE_MATCH_1}}/licences/*)
     foreach(text IN LISTS texts)

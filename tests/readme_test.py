@@ -203,9 +203,8 @@ def on_a_bare_root(source):
         (root / "etc/apt/apt.conf.d/90machine").write_text(
             "".join(re.findall(r"^Acquire::https?::.*\n", ways, re.MULTILINE)), "utf-8")
         (root / "etc/dpkg/dpkg.cfg.d/quick").write_text("force-unsafe-io\n", "utf-8")
-        for name in ("lapack", "openblas"):
-            if (cache / name).exists():
-                shutil.copytree(cache / name, root / "root/.cache/qxanalysis" / name)
+        if (cache / "lapack").exists():
+            shutil.copytree(cache / "lapack", root / "root/.cache/qxanalysis/lapack")
         packages = cache / PACKAGES_CACHE
         (packages / "partial").mkdir(parents=True, exist_ok=True)
         return subprocess.run(["unshare", "--mount", "--propagation", "private", "bash", "-c", ENTER, "bash",

@@ -1,62 +1,18 @@
 #include "linalg/lapack.h"
 
 #include "linalg/aligned.h"
-#include "linalg/blas_memory.h"
 
 // LAPACK's complex elements are ours.
 #define lapack_complex_float CSG
 #define lapack_complex_double CDB
-#include <cblas.h>
 #include <lapack.h>
 
 namespace qx {
-
-namespace blas {
-
-namespace {
-
-template <class View>
-int32_t LeadingOf(const View &a) {
-    return static_cast<int32_t>(a.stride());
-}
-
-ErrorCode ComplexProduct(CBLAS_TRANSPOSE transposition, ConstComplexMatrix a, ConstComplexMatrix b,
-                         ComplexMatrix c) {
-    const BlasMemory memory;
-    if (!memory)
-        return ErrOutOfMemory;
-    const CDB one = {1.0, 0.0}, zero = {0.0, 0.0};
-    cblas_zgemm(CblasRowMajor, CblasNoTrans, transposition, c.rows(), c.cols(), a.cols(), &one,
-                a.data(), LeadingOf(a), b.data(), LeadingOf(b), &zero, c.data(), LeadingOf(c));
-    return 0;
-}
-
-} // namespace
-
-ErrorCode Product(ConstRealMatrix a, ConstRealMatrix b, RealMatrix c) {
-    const BlasMemory memory;
-    if (!memory)
-        return ErrOutOfMemory;
-    cblas_dgemm(CblasRowMajor, CblasNoTrans, CblasNoTrans, c.rows(), c.cols(), a.cols(), 1.0,
-                a.data(), LeadingOf(a), b.data(), LeadingOf(b), 0.0, c.data(), LeadingOf(c));
-    return 0;
-}
-ErrorCode Product(ConstComplexMatrix a, ConstComplexMatrix b, ComplexMatrix c) {
-    return ComplexProduct(CblasNoTrans, a, b, c);
-}
-ErrorCode ProductWithConjugate(ConstComplexMatrix a, ConstComplexMatrix b, ComplexMatrix c) {
-    return ComplexProduct(CblasConjTrans, a, b, c);
-}
-
-} // namespace blas
 
 namespace lapack {
 
 int32_t SolveBand(int32_t n, int32_t lower, int32_t upper, int32_t rightSides, DBL *band,
                   int32_t *pivots, DBL *b) {
-    const BlasMemory memory;
-    if (!memory)
-        return noMemory;
     const int32_t leading = 2 * lower + upper + 1;
     int32_t info = 0;
     LAPACK_dgbsv(&n, &lower, &upper, &rightSides, band, &leading, pivots, b, &n, &info);
@@ -65,9 +21,6 @@ int32_t SolveBand(int32_t n, int32_t lower, int32_t upper, int32_t rightSides, D
 
 int32_t SolveBand(int32_t n, int32_t lower, int32_t upper, int32_t rightSides, CDB *band,
                   int32_t *pivots, CDB *b) {
-    const BlasMemory memory;
-    if (!memory)
-        return noMemory;
     const int32_t leading = 2 * lower + upper + 1;
     int32_t info = 0;
     LAPACK_zgbsv(&n, &lower, &upper, &rightSides, band, &leading, pivots, b, &n, &info);
@@ -101,10 +54,9 @@ char Job(const void *vectors) { return vectors != nullptr ? 'V' : 'N'; }
 } // namespace
 
 int32_t Schur(int32_t n, DBL *t, CDB *w, DBL *z) {
-    const BlasMemory memory;
     ScratchParts results, working;
     DBL *wr, *wi, *work, size;
-    if (!memory || results.take(Aligned(Sized(wr, n)), Aligned(Sized(wi, n))) != 0)
+    if (results.take(Aligned(Sized(wr, n)), Aligned(Sized(wi, n))) != 0)
         return noMemory;
     const char job = Job(z);
     int32_t info = 0, selected = 0, length = -1;
@@ -120,11 +72,10 @@ int32_t Schur(int32_t n, DBL *t, CDB *w, DBL *z) {
     return info;
 }
 int32_t Schur(int32_t n, CDB *t, CDB *w, CDB *z) {
-    const BlasMemory memory;
     ScratchParts results, working;
     DBL *real;
     CDB *values, *work, size;
-    if (!memory || results.take(Aligned(Sized(real, n)), Aligned(Sized(values, n))) != 0)
+    if (results.take(Aligned(Sized(real, n)), Aligned(Sized(values, n))) != 0)
         return noMemory;
     const char job = Job(z);
     int32_t info = 0, selected = 0, length = -1;
@@ -141,10 +92,9 @@ int32_t Schur(int32_t n, CDB *t, CDB *w, CDB *z) {
 }
 
 int32_t MoveInSchur(int32_t n, DBL *t, DBL *z, int32_t from, int32_t to) {
-    const BlasMemory memory;
     ScratchParts working;
     DBL *work;
-    if (!memory || working.take(Aligned(Sized(work, n))) != 0)
+    if (working.take(Aligned(Sized(work, n))) != 0)
         return noMemory;
     const char job = Job(z);
     int32_t info = 0, first = from + 1, last = to + 1;
@@ -152,9 +102,6 @@ int32_t MoveInSchur(int32_t n, DBL *t, DBL *z, int32_t from, int32_t to) {
     return info;
 }
 int32_t MoveInSchur(int32_t n, CDB *t, CDB *z, int32_t from, int32_t to) {
-    const BlasMemory memory;
-    if (!memory)
-        return noMemory;
     const char job = Job(z);
     const int32_t first = from + 1, last = to + 1;
     int32_t info = 0;
@@ -163,11 +110,9 @@ int32_t MoveInSchur(int32_t n, CDB *t, CDB *z, int32_t from, int32_t to) {
 }
 
 int32_t GeneralisedSchur(int32_t n, DBL *s, DBL *t, CDB *alpha, DBL *beta, DBL *q, DBL *z) {
-    const BlasMemory memory;
     ScratchParts results, working;
     DBL *re, *im, *divisor, *work, size;
-    if (!memory ||
-        results.take(Aligned(Sized(re, n)), Aligned(Sized(im, n)), Aligned(Sized(divisor, n))) != 0)
+    if (results.take(Aligned(Sized(re, n)), Aligned(Sized(im, n)), Aligned(Sized(divisor, n))) != 0)
         return noMemory;
     int32_t info = 0, selected = 0, length = -1;
     LAPACK_dgges("V", "V", "N", nullptr, &n, s, &n, t, &n, &selected, re, im, divisor, q, &n, z, &n,
@@ -184,11 +129,10 @@ int32_t GeneralisedSchur(int32_t n, DBL *s, DBL *t, CDB *alpha, DBL *beta, DBL *
     return info;
 }
 int32_t GeneralisedSchur(int32_t n, CDB *s, CDB *t, CDB *alpha, CDB *beta, CDB *q, CDB *z) {
-    const BlasMemory memory;
     ScratchParts results, working;
     CDB *dividend, *divisor, *work, size;
     DBL *real;
-    if (!memory || results.take(Aligned(Sized(dividend, n)), Aligned(Sized(divisor, n)),
+    if (results.take(Aligned(Sized(dividend, n)), Aligned(Sized(divisor, n)),
                                 Aligned(Sized(real, 8 * int64_t{n}))) != 0)
         return noMemory;
     int32_t info = 0, selected = 0, length = -1;
@@ -208,11 +152,10 @@ int32_t GeneralisedSchur(int32_t n, CDB *s, CDB *t, CDB *alpha, CDB *beta, CDB *
 
 int32_t MoveInGeneralisedSchur(int32_t n, DBL *s, DBL *t, DBL *q, DBL *z, int32_t from,
                                int32_t to) {
-    const BlasMemory memory;
     ScratchParts working;
     DBL *work;
     const int32_t length = 4 * n + 16, yes = 1;
-    if (!memory || working.take(Aligned(Sized(work, length))) != 0)
+    if (working.take(Aligned(Sized(work, length))) != 0)
         return noMemory;
     int32_t info = 0, first = from + 1, last = to + 1;
     LAPACK_dtgexc(&yes, &yes, &n, s, &n, t, &n, q, &n, z, &n, &first, &last, work, &length, &info);
@@ -220,9 +163,6 @@ int32_t MoveInGeneralisedSchur(int32_t n, DBL *s, DBL *t, DBL *q, DBL *z, int32_
 }
 int32_t MoveInGeneralisedSchur(int32_t n, CDB *s, CDB *t, CDB *q, CDB *z, int32_t from,
                                int32_t to) {
-    const BlasMemory memory;
-    if (!memory)
-        return noMemory;
     const int32_t yes = 1, first = from + 1;
     int32_t info = 0, last = to + 1;
     LAPACK_ztgexc(&yes, &yes, &n, s, &n, t, &n, q, &n, z, &n, &first, &last, &info);
@@ -230,21 +170,19 @@ int32_t MoveInGeneralisedSchur(int32_t n, CDB *s, CDB *t, CDB *q, CDB *z, int32_
 }
 
 int32_t GeneralisedVectors(int32_t n, const DBL *s, const DBL *t, DBL *z) {
-    const BlasMemory memory;
     ScratchParts working;
     DBL *work;
-    if (!memory || working.take(Aligned(Sized(work, 6 * int64_t{n}))) != 0)
+    if (working.take(Aligned(Sized(work, 6 * int64_t{n}))) != 0)
         return noMemory;
     int32_t info = 0, found = 0;
     LAPACK_dtgevc("R", "B", nullptr, &n, s, &n, t, &n, nullptr, &n, z, &n, &n, &found, work, &info);
     return info;
 }
 int32_t GeneralisedVectors(int32_t n, const CDB *s, const CDB *t, CDB *z) {
-    const BlasMemory memory;
     ScratchParts working;
     CDB *work;
     DBL *real;
-    if (!memory || working.take(Aligned(Sized(work, 2 * int64_t{n})),
+    if (working.take(Aligned(Sized(work, 2 * int64_t{n})),
                                 Aligned(Sized(real, 2 * int64_t{n}))) != 0)
         return noMemory;
     int32_t info = 0, found = 0;
@@ -256,11 +194,10 @@ int32_t GeneralisedVectors(int32_t n, const CDB *s, const CDB *t, CDB *z) {
 int32_t GeneralisedSingular(int32_t m, int32_t n, int32_t p, DBL *a, DBL *b,
                             GeneralisedRanks *ranks, DBL *alpha, DBL *beta, DBL *u, DBL *v,
                             DBL *q) {
-    const BlasMemory memory;
     ScratchParts results, working;
     I32 *order;
     DBL *work, size;
-    if (!memory || results.take(Aligned(Sized(order, n))) != 0)
+    if (results.take(Aligned(Sized(order, n))) != 0)
         return noMemory;
     int32_t info = 0, length = -1, k = 0, l = 0;
     LAPACK_dggsvd3("U", "V", "Q", &m, &n, &p, &k, &l, a, &m, b, &p, alpha, beta, u, &m, v, &p, q,
@@ -276,13 +213,11 @@ int32_t GeneralisedSingular(int32_t m, int32_t n, int32_t p, DBL *a, DBL *b,
 int32_t GeneralisedSingular(int32_t m, int32_t n, int32_t p, CDB *a, CDB *b,
                             GeneralisedRanks *ranks, DBL *alpha, DBL *beta, CDB *u, CDB *v,
                             CDB *q) {
-    const BlasMemory memory;
     ScratchParts results, working;
     I32 *order;
     DBL *real;
     CDB *work, size;
-    if (!memory ||
-        results.take(Aligned(Sized(order, n)), Aligned(Sized(real, 2 * int64_t{n}))) != 0)
+    if (results.take(Aligned(Sized(order, n)), Aligned(Sized(real, 2 * int64_t{n}))) != 0)
         return noMemory;
     int32_t info = 0, length = -1, k = 0, l = 0;
     LAPACK_zggsvd3("U", "V", "Q", &m, &n, &p, &k, &l, a, &m, b, &p, alpha, beta, u, &m, v, &p, q,

@@ -13,23 +13,10 @@ struct GeneralisedRanks {
     int32_t k, l;
 };
 
-// What the library calls of BLAS and LAPACK, overloaded by element. Nothing else includes their
-// headers. Their kernels differ between processors, and so do the last bits of what goes through
-// them. LAPACK's matrices are column after column and without gaps, hence plain pointers and sizes:
-// see CopyTransposed.
-
-namespace blas {
-
-// Each returns 0 or ErrOutOfMemory. No matrix is empty.
-
-// c = a b.
-ErrorCode Product(ConstRealMatrix a, ConstRealMatrix b, RealMatrix c);
-ErrorCode Product(ConstComplexMatrix a, ConstComplexMatrix b, ComplexMatrix c);
-
-// c = a b^H.
-ErrorCode ProductWithConjugate(ConstComplexMatrix a, ConstComplexMatrix b, ComplexMatrix c);
-
-} // namespace blas
+// What the library calls of LAPACK, overloaded by element. Nothing else includes its header. The
+// BLAS below it is that of LAPACK's own source, and ours where it is costly (blas/). LAPACK's
+// matrices are column after column and without gaps, hence plain pointers and sizes: see
+// CopyTransposed.
 
 namespace lapack {
 

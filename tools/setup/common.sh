@@ -25,7 +25,7 @@ fail() {
 # at, or what a set-up script says.
 progress() {
     tail -c 4096 "$1" | grep -aoE \
-        -e '^\[([0-9]+/[0-9]+\]|(libm|lapack|openblas|native|setup|run)\].{1,60})' \
+        -e '^\[([0-9]+/[0-9]+\]|(libm|lapack|native|setup|run)\].{1,60})' \
         -e '^ *[0-9]+/[0-9]+ Test +#[0-9]+: [^ ]+' \
         -e '^(Get:[0-9]+|(Unpacking|Setting up|I: [A-Z][a-z]+ing) [^ ]+)' | tail -n 1 || true
 }

@@ -1,6 +1,7 @@
 #!/usr/bin/python3
-"""fortran_order.py SOURCE NAME...: the files of a source of LAPACK that hold the named routines, and
-all that these mention, in an order in which they can be compiled.
+"""fortran_order.py SOURCE NAME...: the files of a source of LAPACK, with its BLAS, that hold the named
+routines, and all that these mention, in an order in which they can be compiled. A routine named with a
+dash before it, "-dgemm", is left out: it comes from elsewhere.
 
 Prints a line for each file, "STAGE PATH". A file uses modules of files of lower stages only, so the
 files of one stage can be compiled at the same time.
@@ -32,7 +33,7 @@ class File:
 def files_of(source):
     """The file of each routine and of each module, by name."""
     files = {}
-    for folder in ("SRC", "INSTALL"):
+    for folder in ("SRC", "INSTALL", "BLAS/SRC"):
         for path in sorted((source / folder).glob("*")):
             name = path.stem.lower()
             if path.suffix.lower() in SUFFIXES and not name.endswith("test") and name not in (
@@ -72,8 +73,12 @@ def stages(chosen):
 
 def main(source, *names):
     files = files_of(Path(source))
-    if missing := [name for name in names if name not in files]:
+    if missing := [name for name in names if name.lstrip("-") not in files]:
         sys.exit(f"{source} has no {', '.join(missing)}")
+    for name in names:
+        if name.startswith("-"):
+            del files[name[1:]]
+    names = [name for name in names if name in files]
     for stage, path in stages(closure(files, names)):
         print(stage, path)
 

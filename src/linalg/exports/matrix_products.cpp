@@ -14,8 +14,10 @@ Outcome Product(In<Matrix> a, In<Matrix> b, Out<Matrix> c, bool copied) {
         return ErrNegativeDimension;
     if (const Outcome bad = c.resize(a.rows(), b.cols()))
         return bad;
-    return (copied ? MatrixProductOfCopies<elementOf<Matrix>>
-                   : MatrixProduct<elementOf<Matrix>>)(a.view(), b.view(), c.view());
+    if (copied)
+        return MatrixProductOfCopies<elementOf<Matrix>>(a.view(), b.view(), c.view());
+    MatrixProduct<elementOf<Matrix>>(a.view(), b.view(), c.view());
+    return 0;
 }
 
 // The copy that a caller asks for would change nothing here.
@@ -41,8 +43,10 @@ Outcome VectorTimesMatrix(In<Vector> x, In<Matrix> a, Out<Vector> y, bool copied
         return ErrNegativeDimension;
     if (const Outcome bad = y.resize(a.cols()))
         return bad;
-    return (copied ? MatrixProductOfCopies<elementOf<Matrix>>
-                   : MatrixProduct<elementOf<Matrix>>)(AsRow(x.view()), a.view(), AsRow(y.view()));
+    if (copied)
+        return MatrixProductOfCopies<elementOf<Matrix>>(AsRow(x.view()), a.view(), AsRow(y.view()));
+    MatrixProduct<elementOf<Matrix>>(AsRow(x.view()), a.view(), AsRow(y.view()));
+    return 0;
 }
 
 } // namespace

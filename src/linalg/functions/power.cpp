@@ -27,14 +27,12 @@ ErrorCode MatrixPower(ConstMatrixView<E> a, int32_t power, MatrixView<E> out) {
             CopyMatrix<E>(base, result);
             isIdentity = false;
         } else if ((rest & 1) != 0) {
-            if (const ErrorCode failed = MatrixProduct<E>(base, result, spare))
-                return failed;
+            MatrixProduct<E>(base, result, spare);
             std::swap(result, spare);
         }
         if (rest == 1)
             break;
-        if (const ErrorCode failed = MatrixProduct<E>(base, base, spare))
-            return failed;
+        MatrixProduct<E>(base, base, spare);
         std::swap(base, spare);
     }
     if (isIdentity)

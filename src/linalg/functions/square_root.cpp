@@ -45,10 +45,8 @@ ErrorCode MatrixSquareRoot(ConstComplexMatrix a, ComplexMatrix root) {
         return ErrNonFiniteInput;
     const ErrorCode status = n > 1 && AbsSum(w[n - 2]) < negligible ? WarnLowAccuracy : 0;
     TriangularSquareRoot(t, r);
-    if (const ErrorCode failed = MatrixProduct<ElementType::CDB>(u, r, t))
-        return failed;
-    if (const ErrorCode failed = ProductWithConjugate(t, u, root))
-        return failed;
+    MatrixProduct<ElementType::CDB>(u, r, t);
+    ProductWithConjugate(t, u, root);
     return status;
 }
 

@@ -1,6 +1,5 @@
 #include "linalg/products/products.h"
 
-#include "linalg/lapack.h"
 #include "linalg/matrix.h"
 #include "linalg/products/ordered.h"
 
@@ -12,33 +11,27 @@ namespace qx {
 
 namespace {
 
-// Up to here the ordered product is as fast as BLAS.
-constexpr int64_t smallProduct = 32 * 32 * 32;
-
-// Large products run in bands, so that a band of a and of the result stays in the caches.
-constexpr int32_t band = 1530;
-
 template <ElementType E>
 bool Fit(ConstMatrixView<E> a, ConstMatrixView<E> b, ConstMatrixView<E> c) {
     return a.cols() == b.rows() && a.rows() == c.rows() && b.cols() == c.cols();
 }
 
 template <ElementType E>
-ErrorCode Multiply(ConstMatrixView<E> a, ConstMatrixView<E> b, MatrixView<E> c) {
-    const int32_t m = a.rows(), k = a.cols(), n = b.cols();
-    if (int64_t{m} * n * k <= smallProduct) {
-        OrderedProduct<E>(a, b, c);
-        return 0;
-    }
-    const bool inBands = E == ElementType::DBL && m > band && k > 256 && n > 2;
-    const int32_t step = inBands ? band : m;
-    for (int32_t i = 0; i < m; i += step) {
-        const int32_t rows = std::min(step, m - i);
-        if (const ErrorCode failed =
-                blas::Product(a.block(i, 0, rows, k), b, c.block(i, 0, rows, n)))
-            return failed;
-    }
-    return 0;
+void AddMultiple(double factor, ConstMatrixView<E> a, ConstMatrixView<E> b, MatrixView<E> c) {
+    QX_EXPECTS(Fit<E>(a, b, c));
+    if constexpr (E == ElementType::DBL)
+        AddProductReal(a.rows(), b.cols(), a.cols(), {factor}, {a.data(), a.stride(), 1},
+                       {b.data(), b.stride(), 1}, c.data(), c.stride());
+    else
+        AddProductComplex(a.rows(), b.cols(), a.cols(), {factor, 0.0},
+                          {a.data(), a.stride(), 1, false}, {b.data(), b.stride(), 1, false},
+                          c.data(), c.stride());
+}
+
+template <ElementType E>
+void ClearRows(MatrixView<E> c) {
+    for (int32_t i = 0; i < c.rows(); ++i)
+        Fill(reinterpret_cast<DBL *>(c.row(i)), std::ptrdiff_t{c.cols()} * partsOf<E>, 0.0);
 }
 
 // kept: the empty sum is NaN and not zero
@@ -51,20 +44,20 @@ void FillWithNaN(MatrixView<E> c) {
 } // namespace
 
 template <ElementType E>
-ErrorCode MatrixProduct(ConstMatrixView<E> a, ConstMatrixView<E> b, MatrixView<E> c) {
-    QX_EXPECTS(Fit<E>(a, b, c) && a.isWhole() && b.isWhole() && c.isWhole());
-    if (c.isEmpty())
-        return 0;
+void MatrixProduct(ConstMatrixView<E> a, ConstMatrixView<E> b, MatrixView<E> c) {
+    QX_EXPECTS(Fit<E>(a, b, c) && c.isWhole());
     if (a.cols() > 0)
-        return Multiply<E>(a, b, c);
-    FillWithNaN<E>(c);
-    return 0;
+        OrderedProduct<E>(a, b, c);
+    else
+        FillWithNaN<E>(c);
 }
 
 template <ElementType E>
 ErrorCode MatrixProductOfCopies(ConstMatrixView<E> a, ConstMatrixView<E> b, MatrixView<E> c) {
-    if (c.isEmpty() || a.cols() == 0)
-        return MatrixProduct<E>(a, b, c);
+    if (c.isEmpty() || a.cols() == 0) {
+        MatrixProduct<E>(a, b, c);
+        return 0;
+    }
     MatrixView<E> aCopy, bCopy, cCopy;
     ScratchParts memory;
     if (const ErrorCode failed =
@@ -73,44 +66,32 @@ ErrorCode MatrixProductOfCopies(ConstMatrixView<E> a, ConstMatrixView<E> b, Matr
         return failed;
     CopyMatrix<E>(a, aCopy);
     CopyMatrix<E>(b, bCopy);
-    if (const ErrorCode failed = MatrixProduct<E>(aCopy, bCopy, cCopy))
-        return failed;
+    MatrixProduct<E>(aCopy, bCopy, cCopy);
     CopyMatrix<E>(cCopy, c);
     return 0;
 }
 
 template <ElementType E>
 void AddProduct(ConstMatrixView<E> a, ConstMatrixView<E> b, MatrixView<E> c) {
-    QX_EXPECTS(Fit<E>(a, b, c));
-    if constexpr (E == ElementType::DBL)
-        AddProductReal(a.rows(), b.cols(), a.cols(), a.data(), a.stride(), b.data(), b.stride(),
-                       c.data(), c.stride());
-    else
-        AddProductComplex(a.rows(), b.cols(), a.cols(), a.data(), a.stride(), b.data(), b.stride(),
-                          c.data(), c.stride());
+    AddMultiple<E>(1.0, a, b, c);
 }
 
 template <ElementType E>
 void SubtractProduct(ConstMatrixView<E> a, ConstMatrixView<E> b, MatrixView<E> c) {
-    QX_EXPECTS(Fit<E>(a, b, c));
-    if constexpr (E == ElementType::DBL)
-        SubtractProductReal(a.rows(), b.cols(), a.cols(), a.data(), a.stride(), b.data(),
-                            b.stride(), c.data(), c.stride());
-    else
-        SubtractProductComplex(a.rows(), b.cols(), a.cols(), a.data(), a.stride(), b.data(),
-                               b.stride(), c.data(), c.stride());
+    AddMultiple<E>(-1.0, a, b, c);
 }
 
 template <ElementType E>
 void OrderedProduct(ConstMatrixView<E> a, ConstMatrixView<E> b, MatrixView<E> c) {
-    for (int32_t i = 0; i < c.rows(); ++i)
-        Fill(reinterpret_cast<DBL *>(c.row(i)), std::ptrdiff_t{c.cols()} * partsOf<E>, 0.0);
+    ClearRows<E>(c);
     AddProduct<E>(a, b, c);
 }
 
-ErrorCode ProductWithConjugate(ConstComplexMatrix a, ConstComplexMatrix b, ComplexMatrix c) {
-    QX_EXPECTS(a.cols() > 0 && a.cols() == b.cols() && !c.isEmpty());
-    return blas::ProductWithConjugate(a, b, c);
+void ProductWithConjugate(ConstComplexMatrix a, ConstComplexMatrix b, ComplexMatrix c) {
+    QX_EXPECTS(a.cols() == b.cols() && c.rows() == a.rows() && c.cols() == b.rows());
+    ClearRows<ElementType::CDB>(c);
+    AddProductComplex(a.rows(), b.rows(), a.cols(), {1.0, 0.0}, {a.data(), a.stride(), 1, false},
+                      {b.data(), 1, b.stride(), true}, c.data(), c.stride());
 }
 
 // Four rows at a time: four sums that do not wait for each other.
@@ -139,8 +120,8 @@ void MatrixVectorProduct(ConstMatrixView<E> a, ConstVectorView<E> x, VectorView<
         dot(std::integral_constant<int, 1>(), i);
 }
 
-template ErrorCode MatrixProduct(ConstRealMatrix, ConstRealMatrix, RealMatrix);
-template ErrorCode MatrixProduct(ConstComplexMatrix, ConstComplexMatrix, ComplexMatrix);
+template void MatrixProduct(ConstRealMatrix, ConstRealMatrix, RealMatrix);
+template void MatrixProduct(ConstComplexMatrix, ConstComplexMatrix, ComplexMatrix);
 template ErrorCode MatrixProductOfCopies(ConstRealMatrix, ConstRealMatrix, RealMatrix);
 template ErrorCode MatrixProductOfCopies(ConstComplexMatrix, ConstComplexMatrix, ComplexMatrix);
 template void AddProduct(ConstRealMatrix, ConstRealMatrix, RealMatrix);

@@ -1,4 +1,3 @@
-#include "linalg/blas_memory.h"
 #include "linalg/lapack.h"
 #include "linalg/matrix.h"
 #include "linalg/products/products.h"
@@ -8,7 +7,6 @@
 
 #include <cmath>
 #include <complex>
-#include <memory>
 #include <thread>
 #include <vector>
 
@@ -52,7 +50,7 @@ TEST(Products, TransposesAndConjugates) {
     for (int i = 0; i < m; ++i)
         for (int j = 0; j < n; ++j)
             EXPECT_EQ(t[j * m + i].im, a[i * n + j].im);
-    ASSERT_EQ(qx::ProductWithConjugate(View(a, m, n), View(a, m, n), View(product, m, m)), 0);
+    qx::ProductWithConjugate(View(a, m, n), View(a, m, n), View(product, m, m));
     for (CDB &z : t)
         z = qx::Conj(z);
     EXPECT_LT(ErrorOfProduct(a, t, product, m, n, m), 8e-16);
@@ -75,25 +73,7 @@ TEST(Lapack, BandAndTridiagonalDriversSolve) {
     }
 }
 
-// Only as many may call at once as there are blocks; who comes late gets a code and may come again.
-TEST(Blas, RefusesCallersWithoutMemory) {
-    if (sizeof(void *) == 4)
-        GTEST_SKIP() << "the blocks, which are kept, would fill the address space";
-    const int n = 40;
-    const auto a = Reals(n * n, 1);
-    std::vector<double> c(n * n);
-    {
-        std::vector<std::unique_ptr<qx::BlasMemory>> callers;
-        do
-            callers.push_back(std::make_unique<qx::BlasMemory>());
-        while (*callers.back() && callers.size() < 5000);
-        ASSERT_LT(callers.size(), 5000U);
-        EXPECT_EQ(Multiply(View(a, n, n), View(a, n, n), View(c, n, n)), ErrOutOfMemory);
-    }
-    EXPECT_EQ(Multiply(View(a, n, n), View(a, n, n), View(c, n, n)), 0);
-}
-
-TEST(Blas, ThreadsAtOnceGetTheBitsOfOneAlone) {
+TEST(Products, ThreadsAtOnceGetTheBitsOfOneAlone) {
     const int n = 150;
     const auto a = Reals(n * n, 1), b = Reals(n * n, 2);
     std::vector<double> expected(n * n);
