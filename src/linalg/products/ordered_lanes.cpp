@@ -21,8 +21,17 @@ constexpr std::ptrdiff_t smallDepth = 64;
 constexpr std::ptrdiff_t smallBand = 128;
 constexpr std::ptrdiff_t smallProduct = 40 * 40 * 40;
 
-// What happens to an element of a on its way.
+// What happens to an element of a on its way: none of it where it has been packed.
 enum class Sign { plus, minus, scaled };
+struct Packed {
+    static constexpr Sign sign = Sign::plus;
+    static constexpr bool isConjugated = false;
+};
+template <Sign S, bool Conjugated>
+struct Taken {
+    static constexpr Sign sign = S;
+    static constexpr bool isConjugated = Conjugated;
+};
 
 struct Real {
     typedef DBL T;
@@ -87,10 +96,10 @@ struct Real {
             x.store(c);
             y.store(c + nativeLanes);
         }
-        template <Sign S>
+        template <class How>
         QX_INLINE void add(const DBL *a, Factor factor, L bx, L by) {
-            const L value(S == Sign::scaled ? factor.value * *a : *a);
-            if constexpr (S == Sign::minus) {
+            const L value(How::sign == Sign::scaled ? factor.value * *a : *a);
+            if constexpr (How::sign == Sign::minus) {
                 x = x - value * bx;
                 y = y - value * by;
             } else {
@@ -153,18 +162,18 @@ struct Complex {
             TurnsLow(re, im).store(c);
             TurnsHigh(re, im).store(c + nativeLanes);
         }
-        template <Sign S>
+        template <class How>
         QX_INLINE void add(const DBL *a, Factor factor, L bRe, L bIm) {
-            double x = a[0], y = a[1];
-            if constexpr (S == Sign::scaled) {
+            double x = a[0], y = How::isConjugated ? -a[1] : a[1];
+            if constexpr (How::sign == Sign::scaled) {
                 const double scaled = factor.re * x - factor.im * y;
                 y = factor.re * y + factor.im * x;
                 x = scaled;
             }
             const L vx(x), vy(y);
             const L termRe = vx * bRe - vy * bIm, termIm = vx * bIm + vy * bRe;
-            re = S == Sign::minus ? re - termRe : re + termRe;
-            im = S == Sign::minus ? im - termIm : im + termIm;
+            re = How::sign == Sign::minus ? re - termRe : re + termRe;
+            im = How::sign == Sign::minus ? im - termIm : im + termIm;
         }
         L re, im;
     };
@@ -176,7 +185,7 @@ struct Place {
     std::ptrdiff_t down, across;
 };
 
-template <class Field, Sign S, std::ptrdiff_t Rows>
+template <class Field, class How, std::ptrdiff_t Rows>
 QX_INLINE void AddToTile(std::ptrdiff_t k, typename Field::Factor factor, const Place &a,
                          const DBL *panel, DBL *c, std::ptrdiff_t cStride) {
     typename Field::Sums sums[Rows];
@@ -186,7 +195,7 @@ QX_INLINE void AddToTile(std::ptrdiff_t k, typename Field::Factor factor, const 
     for (std::ptrdiff_t p = 0; p < k; ++p) {
         const L first = L::load(panel), second = L::load(panel + nativeLanes);
         for (std::ptrdiff_t r = 0; r < Rows; ++r)
-            sums[r].template add<S>(at + r * a.down, factor, first, second);
+            sums[r].template add<How>(at + r * a.down, factor, first, second);
         panel += 2 * nativeLanes;
         at += a.across;
     }
@@ -195,27 +204,27 @@ QX_INLINE void AddToTile(std::ptrdiff_t k, typename Field::Factor factor, const 
 }
 
 // At the right edge a full tile is computed aside.
-template <class Field, Sign S, std::ptrdiff_t Rows>
+template <class Field, class How, std::ptrdiff_t Rows>
 void AddToEdge(std::ptrdiff_t k, typename Field::Factor factor, const Place &a, const DBL *panel,
                DBL *c, std::ptrdiff_t cStride, std::ptrdiff_t width) {
     DBL aside[Rows * 2 * nativeLanes] = {};
     for (std::ptrdiff_t r = 0; r < Rows; ++r)
         for (std::ptrdiff_t j = 0; j < width; ++j)
             aside[r * 2 * nativeLanes + j] = c[r * cStride + j];
-    AddToTile<Field, S, Rows>(k, factor, a, panel, aside, 2 * nativeLanes);
+    AddToTile<Field, How, Rows>(k, factor, a, panel, aside, 2 * nativeLanes);
     for (std::ptrdiff_t r = 0; r < Rows; ++r)
         for (std::ptrdiff_t j = 0; j < width; ++j)
             c[r * cStride + j] = aside[r * 2 * nativeLanes + j];
 }
 
 // `width` doubles of each of the rows.
-template <class Field, Sign S, std::ptrdiff_t Rows>
+template <class Field, class How, std::ptrdiff_t Rows>
 QX_INLINE void AddToRows(std::ptrdiff_t k, typename Field::Factor factor, const Place &a,
                          const DBL *panel, DBL *c, std::ptrdiff_t cStride, std::ptrdiff_t width) {
     if (width == 2 * nativeLanes)
-        AddToTile<Field, S, Rows>(k, factor, a, panel, c, cStride);
+        AddToTile<Field, How, Rows>(k, factor, a, panel, c, cStride);
     else
-        AddToEdge<Field, S, Rows>(k, factor, a, panel, c, cStride, width);
+        AddToEdge<Field, How, Rows>(k, factor, a, panel, c, cStride, width);
 }
 
 // An operand without its first rows and columns.
@@ -225,7 +234,7 @@ Operand From(Operand a, std::ptrdiff_t row, std::ptrdiff_t col) {
     return a;
 }
 
-template <class Field, Sign S>
+template <class Field, class How>
 void AddSmall(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, typename Field::Factor factor,
               const typename Field::Operand &a, const typename Field::Operand &b, DBL *c,
               std::ptrdiff_t cStride) {
@@ -243,19 +252,31 @@ void AddSmall(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, typename Fie
                                a.down * parts, a.across * parts};
                 DBL *row = c + i * cStride + j * parts;
                 for (; i + Field::tileRows <= bottom; i += Field::tileRows) {
-                    AddToRows<Field, S, Field::tileRows>(terms, factor, place, panel, row, cStride,
+                    AddToRows<Field, How, Field::tileRows>(terms, factor, place, panel, row, cStride,
                                                          cols * parts);
                     place.data += Field::tileRows * place.down;
                     row += Field::tileRows * cStride;
                 }
                 for (; i < bottom; ++i) {
-                    AddToRows<Field, S, 1>(terms, factor, place, panel, row, cStride, cols * parts);
+                    AddToRows<Field, How, 1>(terms, factor, place, panel, row, cStride, cols * parts);
                     place.data += place.down;
                     row += cStride;
                 }
             }
         }
     }
+}
+
+template <class Field, bool Conjugated>
+void AddSmallAs(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, Sign sign,
+                typename Field::Factor factor, const typename Field::Operand &a,
+                const typename Field::Operand &b, DBL *c, std::ptrdiff_t cStride) {
+    if (sign == Sign::plus)
+        AddSmall<Field, Taken<Sign::plus, Conjugated>>(m, n, k, factor, a, b, c, cStride);
+    else if (sign == Sign::minus)
+        AddSmall<Field, Taken<Sign::minus, Conjugated>>(m, n, k, factor, a, b, c, cStride);
+    else
+        AddSmall<Field, Taken<Sign::scaled, Conjugated>>(m, n, k, factor, a, b, c, cStride);
 }
 
 // The slivers of the first rows and terms of a, each with one term after the other.
@@ -283,7 +304,7 @@ void AddPanel(std::ptrdiff_t rows, std::ptrdiff_t k, const DBL *slivers, const D
     constexpr auto add = []<std::ptrdiff_t Rows>(std::ptrdiff_t terms, const DBL *sliver,
                                                  const DBL *b, DBL *to, std::ptrdiff_t stride,
                                                  std::ptrdiff_t doubles) {
-        AddToRows<Field, Sign::plus, Rows>(terms, {}, {sliver, parts, Rows * parts}, b, to, stride,
+        AddToRows<Field, Packed, Rows>(terms, {}, {sliver, parts, Rows * parts}, b, to, stride,
                                            doubles);
     };
     std::ptrdiff_t i = 0;
@@ -341,12 +362,10 @@ void Add(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, typename Field::F
         if (memory.data() != nullptr)
             return AddLarge<Field>(m, n, k, sign, factor, a, b, c, cStride, memory.data());
     }
-    if (sign == Sign::plus)
-        AddSmall<Field, Sign::plus>(m, n, k, factor, a, b, c, cStride);
-    else if (sign == Sign::minus)
-        AddSmall<Field, Sign::minus>(m, n, k, factor, a, b, c, cStride);
-    else
-        AddSmall<Field, Sign::scaled>(m, n, k, factor, a, b, c, cStride);
+    if constexpr (Field::parts == 2)
+        if (a.isConjugated)
+            return AddSmallAs<Field, true>(m, n, k, sign, factor, a, b, c, cStride);
+    AddSmallAs<Field, false>(m, n, k, sign, factor, a, b, c, cStride);
 }
 
 } // namespace
