@@ -336,8 +336,6 @@ enum Quirk : unsigned {
     MayKeepArrayOnFailure = 16,
     // The function has no status: NaN or infinity is its only sign.
     NoStatus = 32,
-    // Goes through BLAS or LAPACK, whose kernels differ between processors.
-    BitsMayDiffer = 64,
     // The code stands in *err, and the function result is the host's own status where the host
     // refused a resize (else 0, as for all others with an error out-parameter).
     HostStatusInResult = 128,
@@ -380,12 +378,8 @@ const std::vector<Recipe> &AllRecipes();
 const std::vector<Exempt> &ExemptExports();
 
 // One hash per export over all its outputs at all the sizes of its recipes.
-struct ExportHash {
-    uint64_t hash = 0;
-    bool mayDiffer = false; // from processor to processor
-};
 typedef std::function<int32_t(const Recipe &, Call &)> Caller;
-std::map<std::string, ExportHash> HashEveryExport(const Caller &caller = [](const Recipe &recipe,
+std::map<std::string, uint64_t> HashEveryExport(const Caller &caller = [](const Recipe &recipe,
                                                                             Call &call) {
     return recipe.run(call);
 });

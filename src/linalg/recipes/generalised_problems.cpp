@@ -17,7 +17,7 @@ Recipe QZ(const char *name, Export qz) {
                 return qz(c.inOut2D<E>(0, c.n, c.n), c.inOut2D<E>(1, c.n, c.n), c.n % 2,
                           c.out2D<E>(0), c.out2D<E>(1), c.out<CDB>(2), c.out<E>(3));
             },
-            BitsMayDiffer, sizes};
+            None, sizes};
 }
 template <ElementType E, class Export>
 Recipe QZ80(std::string name, int32_t order, Export qz) {
@@ -26,7 +26,7 @@ Recipe QZ80(std::string name, int32_t order, Export qz) {
                 return qz(c.inOut2D<E>(0, c.n, c.n), c.inOut2D<E>(1, c.n, c.n), 1, order,
                           c.out2D<E>(0), c.out2D<E>(1), c.out<CDB>(2), c.out<E>(3));
             },
-            BitsMayDiffer, sizes};
+            None, sizes};
 }
 template <ElementType E, class Export>
 Recipe TmiQZ(const char *name, Export qz) {
@@ -36,7 +36,7 @@ Recipe TmiQZ(const char *name, Export qz) {
                           c.out2D<E>(0), c.out2D<E>(1), c.out<CDB>(2), c.out<E>(3),
                           c.out2D<CDB>(4));
             },
-            BitsMayDiffer, sizes};
+            None, sizes};
 }
 template <ElementType E, class Export>
 Recipe Eigen(std::string name, int32_t output, Export eigen) {
@@ -45,7 +45,7 @@ Recipe Eigen(std::string name, int32_t output, Export eigen) {
                 return eigen(c.in2D<E>(0, c.n, c.n), c.in2D<E>(1, c.n, c.n), output, c.out<CDB>(0),
                              c.out2D<CDB>(1));
             },
-            BitsMayDiffer, sizes};
+            None, sizes};
 }
 template <ElementType E, class Export>
 Recipe GSVD(const char *name, Export gsvd) {
@@ -55,7 +55,7 @@ Recipe GSVD(const char *name, Export gsvd) {
                             c.out<DBL>(0), c.out<DBL>(1), c.out2D<E>(2), c.out2D<E>(3),
                             c.out2D<E>(4), c.integer(0), c.integer(1));
             },
-            BitsMayDiffer, sizes};
+            None, sizes};
 }
 
 std::vector<Recipe> GeneralisedRecipes() {

@@ -111,7 +111,7 @@ template <ElementType E, class Export>
 Recipe Band(const std::string &name, Export solve) {
     return {name,
             [=](Call &c) { return solve(c.in2D<E>(0, 4, c.n, Banded), c.inOut<E>(1), 1, 2); },
-            BitsMayDiffer,
+            None,
             {4, 8, 17, 40}};
 }
 template <ElementType E, class Export>
@@ -119,7 +119,7 @@ Recipe BandSet(const std::string &name, Export solve) {
     return {
         name,
         [=](Call &c) { return solve(c.in2D<E>(0, 4, c.n, Banded), c.inOut2D<E>(1, c.n, 3), 1, 2); },
-        BitsMayDiffer,
+        None,
         {4, 8, 17, 40}};
 }
 // The factors of (1, 4, 1): no exchange, a pivot of row i at step i, counted from 1.

@@ -17,12 +17,12 @@ Recipe InPlace(const char *name, Export function) {
             [function](Call &c) {
                 return function(c.inOut2D<Code>(0, c.n, c.n, PositiveDefinite{c.n}), c.err());
             },
-            BitsMayDiffer, sizes};
+            None, sizes};
 }
 template <ElementType Code, class Export>
 Recipe Power(std::string name, int32_t power, Export function) {
     return {name + ": power " + std::to_string(power),
-            [=](Call &c) { return function(c.inOut2D<Code>(0, c.n, c.n), power); }, BitsMayDiffer,
+            [=](Call &c) { return function(c.inOut2D<Code>(0, c.n, c.n), power); }, None,
             sizes};
 }
 template <ElementType Code, class Export>
@@ -31,7 +31,7 @@ Recipe PseudoInverse(const char *name, Export function) {
             [function](Call &c) {
                 return function(c.inOut2D<Code>(0, c.n, c.n + 2), c.byReference(-1.0), c.err());
             },
-            BitsMayDiffer, sizes};
+            None, sizes};
 }
 
 std::vector<Recipe> FunctionRecipes() {
@@ -43,12 +43,12 @@ std::vector<Recipe> FunctionRecipes() {
              return MatrixLn_head(c.in2D<DBL>(0, c.n, c.n, PositiveDefinite{c.n}), c.out2D<CDB>(0),
                                   c.err());
          },
-         BitsMayDiffer, sizes},
+         None, sizes},
         InPlace<CDB>("CxMatrixLn_head", CxMatrixLn_head),
         InPlace<DBL>("MatrixSqrt_head", MatrixSqrt_head),
         {"MatrixSqrtH",
          [](Call &c) { return MatrixSqrtH(c.in2D<DBL>(0, c.n, c.n), c.out2D<CDB>(0)); },
-         BitsMayDiffer, sizes},
+         None, sizes},
         InPlace<CDB>("CxMatrixSqrt_head", CxMatrixSqrt_head),
         PseudoInverse<DBL>("PseudoInverse_head", PseudoInverse_head),
         PseudoInverse<CDB>("CxPseudoInverse_head", CxPseudoInverse_head),
