@@ -15,8 +15,8 @@
 QX_BEGIN_DECLS
 
 /** Matrix product c = a b of an m by k and a k by n matrix. Where k is 0 every element of c is
-    NaN; where m or n is 0, c has no element. Products of more than 32768 terms run through BLAS,
-    and their last bits depend on the processor; smaller ones are summed in ascending order.
+    NaN; where m or n is 0, c has no element. The terms a_ip b_pj of an element are added in
+    ascending order of p, each rounded once as a product and once in the sum.
     Codes: ErrInnerDimensionMismatch (a has not as many columns as b has rows),
     ErrNegativeDimension (a size is below 0), ErrOutOfMemory (no memory, or the host refused the
     resize). */

@@ -9,7 +9,7 @@ namespace qx {
 namespace {
 
 constexpr std::size_t bytes = PanelMemory::size * sizeof(double);
-constexpr int mostBlocks = 64;
+constexpr int mostBlocks = sizeof(void *) == 8 ? 64 : 16;
 
 struct Slot {
     std::atomic<bool> isTaken = false;

@@ -9,7 +9,7 @@ namespace qx {
 
 // Where a product packs its operands: pages of the system, not of the heap, borrowed for one
 // product. Blocks are kept for the next one, of any thread, and given back with the module; there
-// are as many as products have ever run at the same time, at most 64.
+// are as many as products have ever run at the same time, at most 64 (16 with 32-bit addresses).
 class PanelMemory {
 public:
     // In doubles; physical memory is taken as it is touched.
