@@ -4,6 +4,37 @@
 
 namespace qx::QX_WIDTH {
 
+// Complex numbers in a vector, (re, im) by turns: each with its parts exchanged, and with its real
+// or its imaginary part in the place of both.
+static QX_INLINE Lanes<2> Exchanged(Lanes<2> z) {
+    return Lanes<2>(__builtin_shufflevector(z.v, z.v, 1, 0));
+}
+static QX_INLINE Lanes<2> RealParts(Lanes<2> z) {
+    return Lanes<2>(__builtin_shufflevector(z.v, z.v, 0, 0));
+}
+static QX_INLINE Lanes<2> ImaginaryParts(Lanes<2> z) {
+    return Lanes<2>(__builtin_shufflevector(z.v, z.v, 1, 1));
+}
+// (-x, x) by turns.
+template <class L>
+static QX_INLINE L NegativeFirst(double x) {
+    if constexpr (L::count == 2)
+        return L(typename L::Vector{-x, x});
+    else
+        return L(typename L::Vector{-x, x, -x, x});
+}
+#ifdef __AVX2__
+static QX_INLINE Lanes<4> Exchanged(Lanes<4> z) {
+    return Lanes<4>(__builtin_shufflevector(z.v, z.v, 1, 0, 3, 2));
+}
+static QX_INLINE Lanes<4> RealParts(Lanes<4> z) {
+    return Lanes<4>(__builtin_shufflevector(z.v, z.v, 0, 0, 2, 2));
+}
+static QX_INLINE Lanes<4> ImaginaryParts(Lanes<4> z) {
+    return Lanes<4>(__builtin_shufflevector(z.v, z.v, 1, 1, 3, 3));
+}
+#endif
+
 void AddTransposedProductReal(const DBL *a, std::ptrdiff_t stride, int32_t rows, int32_t cols,
                               const DBL *x, DBL *y) {
     int32_t i = 0;
@@ -27,16 +58,37 @@ void AddTransposedProductReal(const DBL *a, std::ptrdiff_t stride, int32_t rows,
     }
 }
 
+// y += the sum of x[i] a[i], rows after each other, for as many elements as a vector has.
+template <class L, int Rows>
+static QX_INLINE void AddComplexRows(const DBL *a, std::ptrdiff_t stride, const CDB *x, DBL *y) {
+    L sum = L::load(y);
+    for (int r = 0; r < Rows; ++r) {
+        const L row = L::load(a + r * stride);
+        sum = sum + (L(x[r].re) * row + NegativeFirst<L>(x[r].im) * Exchanged(row));
+    }
+    sum.store(y);
+}
+
+template <int Rows>
+static void AddComplexRows(const CDB *a, std::ptrdiff_t stride, int32_t cols, const CDB *x,
+                           CDB *y) {
+    const DBL *const rows = reinterpret_cast<const DBL *>(a);
+    DBL *const sums = reinterpret_cast<DBL *>(y);
+    const std::ptrdiff_t end = 2 * std::ptrdiff_t{cols};
+    std::ptrdiff_t j = 0;
+    for (; j + nativeLanes <= end; j += nativeLanes)
+        AddComplexRows<Lanes<nativeLanes>, Rows>(rows + j, 2 * stride, x, sums + j);
+    for (; j < end; j += 2)
+        AddComplexRows<Lanes<2>, Rows>(rows + j, 2 * stride, x, sums + j);
+}
+
 void AddTransposedProductComplex(const CDB *a, std::ptrdiff_t stride, int32_t rows, int32_t cols,
                                  const CDB *x, CDB *y) {
-    for (int32_t i = 0; i < rows; ++i) {
-        const CDB *const row = a + i * stride;
-        const double re = x[i].re, im = x[i].im;
-        for (int32_t j = 0; j < cols; ++j) {
-            y[j].re += re * row[j].re - im * row[j].im;
-            y[j].im += re * row[j].im + im * row[j].re;
-        }
-    }
+    int32_t i = 0;
+    for (; i + 4 <= rows; i += 4)
+        AddComplexRows<4>(a + i * stride, stride, cols, x + i, y);
+    for (; i < rows; ++i)
+        AddComplexRows<1>(a + i * stride, stride, cols, x + i, y);
 }
 
 void AddOuterProductReal(DBL *a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const DBL *x,
@@ -51,57 +103,95 @@ void AddOuterProductReal(DBL *a, std::ptrdiff_t stride, int32_t rows, int32_t co
 
 void AddOuterProductComplex(CDB *a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const CDB *x,
                             const CDB *y) {
-    for (int32_t i = 0; i < rows; ++i) {
-        CDB *const row = a + i * stride;
-        const double re = x[i].re, im = x[i].im;
-        for (int32_t j = 0; j < cols; ++j) {
-            row[j].re += re * y[j].re - im * y[j].im;
-            row[j].im += re * y[j].im + im * y[j].re;
-        }
-    }
+    for (int32_t i = 0; i < rows; ++i)
+        AddComplexRows<1>(y, 0, cols, x + i, a + i * stride);
 }
 
-static double Dot(const DBL *x, const DBL *y, int32_t n) {
+// The products of some rows with x at once.
+template <int Rows>
+static void DotRows(const DBL *a, std::ptrdiff_t stride, int32_t n, const DBL *x, DBL *y) {
     typedef Lanes<nativeLanes> L;
     constexpr int32_t vectors = 8 / nativeLanes;
-    double sum = 0.0;
     int32_t j = 0;
+    double sum[Rows] = {};
     if (n >= 8) {
-        L partial[vectors];
-        for (int32_t v = 0; v < vectors; ++v)
-            partial[v] = L(0.0);
-        for (; j + 8 <= n; j += 8)
+        L partial[Rows][vectors];
+        for (int r = 0; r < Rows; ++r)
             for (int32_t v = 0; v < vectors; ++v)
-                partial[v] = partial[v] +
-                             L::load(x + j + v * nativeLanes) * L::load(y + j + v * nativeLanes);
-        DBL p[8];
-        for (int32_t v = 0; v < vectors; ++v)
-            partial[v].store(p + v * nativeLanes);
-        sum = ((p[0] + p[4]) + (p[2] + p[6])) + ((p[1] + p[5]) + (p[3] + p[7]));
+                partial[r][v] = L(0.0);
+        for (; j + 8 <= n; j += 8)
+            for (int32_t v = 0; v < vectors; ++v) {
+                const L factor = L::load(x + j + v * nativeLanes);
+                for (int r = 0; r < Rows; ++r)
+                    partial[r][v] =
+                        partial[r][v] + L::load(a + r * stride + j + v * nativeLanes) * factor;
+            }
+        for (int r = 0; r < Rows; ++r) {
+            DBL p[8];
+            for (int32_t v = 0; v < vectors; ++v)
+                partial[r][v].store(p + v * nativeLanes);
+            sum[r] = ((p[0] + p[4]) + (p[2] + p[6])) + ((p[1] + p[5]) + (p[3] + p[7]));
+        }
     }
-    for (; j < n; ++j)
-        sum += x[j] * y[j];
-    return sum;
+    for (int r = 0; r < Rows; ++r) {
+        for (int32_t k = j; k < n; ++k)
+            sum[r] += a[r * stride + k] * x[k];
+        y[r] = sum[r];
+    }
 }
 
 void RowProductsReal(const DBL *a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const DBL *x,
                      DBL *y) {
-    for (int32_t i = 0; i < rows; ++i)
-        y[i] = Dot(a + i * stride, x, cols);
+    constexpr int atOnce = nativeLanes == 2 ? 2 : 4; // what the registers hold
+    int32_t i = 0;
+    for (; i + atOnce <= rows; i += atOnce)
+        DotRows<atOnce>(a + i * stride, stride, cols, x, y + i);
+    for (; i < rows; ++i)
+        DotRows<1>(a + i * stride, stride, cols, x, y + i);
+}
+
+// Elements 2 j and 2 j + 1 of the rows go into sums of their own.
+template <int Rows>
+static void ComplexDotRows(const CDB *a, std::ptrdiff_t stride, int32_t n, const CDB *x, CDB *y) {
+    typedef Lanes<nativeLanes> L;
+    constexpr int32_t vectors = 4 / nativeLanes;
+    const L sign = NegativeFirst<L>(1.0);
+    L partial[Rows][vectors];
+    for (int r = 0; r < Rows; ++r)
+        for (int32_t v = 0; v < vectors; ++v)
+            partial[r][v] = L(0.0);
+    int32_t j = 0;
+    for (; j + 2 <= n; j += 2)
+        for (int32_t v = 0; v < vectors; ++v) {
+            const L factor = L::load(&x[j].re + v * nativeLanes);
+            const L turned = Exchanged(factor) * sign;
+            for (int r = 0; r < Rows; ++r) {
+                const L row = L::load(&a[r * stride + j].re + v * nativeLanes);
+                partial[r][v] =
+                    partial[r][v] + (RealParts(row) * factor + ImaginaryParts(row) * turned);
+            }
+        }
+    for (int r = 0; r < Rows; ++r) {
+        DBL p[4];
+        for (int32_t v = 0; v < vectors; ++v)
+            partial[r][v].store(p + v * nativeLanes);
+        if (j < n) {
+            const CDB &z = a[r * stride + j];
+            p[0] += z.re * x[j].re - z.im * x[j].im;
+            p[1] += z.re * x[j].im + z.im * x[j].re;
+        }
+        y[r].re = p[0] + p[2];
+        y[r].im = p[1] + p[3];
+    }
 }
 
 void RowProductsComplex(const CDB *a, std::ptrdiff_t stride, int32_t rows, int32_t cols,
                         const CDB *x, CDB *y) {
-    for (int32_t i = 0; i < rows; ++i) {
-        const CDB *const row = a + i * stride;
-        double re[2] = {0.0, 0.0}, im[2] = {0.0, 0.0};
-        for (int32_t j = 0; j < cols; ++j) {
-            re[j & 1] += row[j].re * x[j].re - row[j].im * x[j].im;
-            im[j & 1] += row[j].re * x[j].im + row[j].im * x[j].re;
-        }
-        y[i].re = re[0] + re[1];
-        y[i].im = im[0] + im[1];
-    }
+    int32_t i = 0;
+    for (; i + 4 <= rows; i += 4)
+        ComplexDotRows<4>(a + i * stride, stride, cols, x, y + i);
+    for (; i < rows; ++i)
+        ComplexDotRows<1>(a + i * stride, stride, cols, x, y + i);
 }
 
 template <class L, int Vectors>
@@ -131,14 +221,21 @@ void RotateRows(DBL *a, std::ptrdiff_t stride, int32_t width, const Rotation *ro
         RotatePanel<Lanes<1>, 1>(a + j, stride, rotations, count);
 }
 
+template <class L>
+static QX_INLINE void RotateComplexSome(DBL *p, DBL *q, double c, CDB s) {
+    const L x = L::load(p), y = L::load(q), turn = NegativeFirst<L>(s.im);
+    (L(c) * x + (L(s.re) * y + turn * Exchanged(y))).store(p);
+    (L(c) * y - (L(s.re) * x - turn * Exchanged(x))).store(q);
+}
+
 void RotateComplexRows(CDB *p, CDB *q, int32_t width, double c, CDB s) {
-    for (int32_t j = 0; j < width; ++j) {
-        const double xRe = p[j].re, xIm = p[j].im, yRe = q[j].re, yIm = q[j].im;
-        p[j].re = c * xRe + (s.re * yRe - s.im * yIm);
-        p[j].im = c * xIm + (s.re * yIm + s.im * yRe);
-        q[j].re = c * yRe - (s.re * xRe + s.im * xIm);
-        q[j].im = c * yIm - (s.re * xIm - s.im * xRe);
-    }
+    DBL *const x = reinterpret_cast<DBL *>(p), *const y = reinterpret_cast<DBL *>(q);
+    const std::ptrdiff_t end = 2 * std::ptrdiff_t{width};
+    std::ptrdiff_t j = 0;
+    for (; j + nativeLanes <= end; j += nativeLanes)
+        RotateComplexSome<Lanes<nativeLanes>>(x + j, y + j, c, s);
+    for (; j < end; j += 2)
+        RotateComplexSome<Lanes<2>>(x + j, y + j, c, s);
 }
 
 template <class L, int Vectors>
