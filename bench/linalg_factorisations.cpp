@@ -84,8 +84,8 @@ void SingularValueDecomposition(bool withVectors) {
         const char job = withVectors ? 'S' : 'N';
         const auto driver = [&](double *work, int32_t length) {
             int32_t info;
-            dgesvd(&job, &job, &n, &n, copy.data(), &n, s.data(), u.data(), &n, v.data(), &n,
-                          work, &length, &info, 1, 1);
+            dgesvd(&job, &job, &n, &n, copy.data(), &n, s.data(), u.data(), &n, v.data(), &n, work,
+                   &length, &info, 1, 1);
         };
         copy = a;
         std::vector<double> work = WorkFor(driver);
@@ -139,8 +139,8 @@ void GeneralEigenproblem() {
         std::vector<double> re(n), im(n), v(a.size()), copy = a;
         const auto driver = [&](double *work, int32_t length) {
             int32_t info;
-            dgeev("N", "V", &n, copy.data(), &n, re.data(), im.data(), nullptr, &n, v.data(),
-                         &n, work, &length, &info, 1, 1);
+            dgeev("N", "V", &n, copy.data(), &n, re.data(), im.data(), nullptr, &n, v.data(), &n,
+                  work, &length, &info, 1, 1);
         };
         std::vector<double> work = WorkFor(driver);
         Compare(

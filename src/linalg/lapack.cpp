@@ -133,7 +133,7 @@ int32_t GeneralisedSchur(int32_t n, CDB *s, CDB *t, CDB *alpha, CDB *beta, CDB *
     CDB *dividend, *divisor, *work, size;
     DBL *real;
     if (results.take(Aligned(Sized(dividend, n)), Aligned(Sized(divisor, n)),
-                                Aligned(Sized(real, 8 * int64_t{n}))) != 0)
+                     Aligned(Sized(real, 8 * int64_t{n}))) != 0)
         return noMemory;
     int32_t info = 0, selected = 0, length = -1;
     LAPACK_zgges("V", "V", "N", nullptr, &n, s, &n, t, &n, &selected, dividend, divisor, q, &n, z,
@@ -182,8 +182,8 @@ int32_t GeneralisedVectors(int32_t n, const CDB *s, const CDB *t, CDB *z) {
     ScratchParts working;
     CDB *work;
     DBL *real;
-    if (working.take(Aligned(Sized(work, 2 * int64_t{n})),
-                                Aligned(Sized(real, 2 * int64_t{n}))) != 0)
+    if (working.take(Aligned(Sized(work, 2 * int64_t{n})), Aligned(Sized(real, 2 * int64_t{n}))) !=
+        0)
         return noMemory;
     int32_t info = 0, found = 0;
     LAPACK_ztgevc("R", "B", nullptr, &n, s, &n, t, &n, nullptr, &n, z, &n, &n, &found, work, real,

@@ -380,7 +380,7 @@ const std::vector<Exempt> &ExemptExports();
 // One hash per export over all its outputs at all the sizes of its recipes.
 typedef std::function<int32_t(const Recipe &, Call &)> Caller;
 std::map<std::string, uint64_t> HashEveryExport(const Caller &caller = [](const Recipe &recipe,
-                                                                            Call &call) {
+                                                                          Call &call) {
     return recipe.run(call);
 });
 

@@ -10,7 +10,9 @@ namespace qx::blas {
 
 // What the routines of BLAS read of their arguments.
 
-inline bool Is(const char *option, char letter) { return *option == letter || *option == letter + 32; }
+inline bool Is(const char *option, char letter) {
+    return *option == letter || *option == letter + 32;
+}
 
 inline bool IsReal(double a, double value) { return a == value; }
 inline bool IsReal(CDB a, double value) { return a.re == value && a.im == 0.0; }

@@ -59,8 +59,8 @@ void AddByRows(std::ptrdiff_t m, std::ptrdiff_t n, typename ScalarOf<E>::type al
             const std::ptrdiff_t rows = std::min(chunkRows, m - i);
             for (std::ptrdiff_t r = 0; copied && r < rows; ++r)
                 copy[r] = conjugated ? Conj(x[i + r]) : x[i + r];
-            RowProducts<E>(Columns<E>(a, lda, i, rows, j, cols),
-                           {copied ? copy : x.data + i, rows}, {part, cols});
+            RowProducts<E>(Columns<E>(a, lda, i, rows, j, cols), {copied ? copy : x.data + i, rows},
+                           {part, cols});
             for (std::ptrdiff_t c = 0; c < cols; ++c)
                 sums[c] = i == 0 ? part[c] : sums[c] + part[c];
         }
@@ -103,9 +103,9 @@ void AddOuter(std::ptrdiff_t m, std::ptrdiff_t n, typename ScalarOf<E>::type alp
             const std::ptrdiff_t cols = std::min(chunkCols, n - j);
             for (std::ptrdiff_t c = 0; c < cols; ++c)
                 factors[c] = alpha * (conjugated ? Conj(right[j + c]) : right[j + c]);
-            AddOuterProduct<E>({a + i + j * lda, static_cast<int32_t>(cols),
-                                static_cast<int32_t>(rows), lda},
-                               {factors, cols}, {left.step == 1 ? left.data + i : copy, rows});
+            AddOuterProduct<E>(
+                {a + i + j * lda, static_cast<int32_t>(cols), static_cast<int32_t>(rows), lda},
+                {factors, cols}, {left.step == 1 ? left.data + i : copy, rows});
         }
     }
 }

@@ -120,9 +120,7 @@ struct Complex {
     static constexpr std::ptrdiff_t tileRows = 4;
     static constexpr std::ptrdiff_t tileCols = nativeLanes;
 
-    static Sign signOf(Factor f) {
-        return f.im != 0.0 ? Sign::scaled : Real::signOf({f.re});
-    }
+    static Sign signOf(Factor f) { return f.im != 0.0 ? Sign::scaled : Real::signOf({f.re}); }
     static void packSliver(const Operand &a, std::ptrdiff_t height, std::ptrdiff_t k, DBL *to) {
         const Lanes<2> sign(Lanes<2>::Vector{1.0, a.isConjugated ? -1.0 : 1.0});
         for (std::ptrdiff_t r = 0; r < height; ++r)
@@ -252,13 +250,14 @@ void AddSmall(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, typename Fie
                                a.down * parts, a.across * parts};
                 DBL *row = c + i * cStride + j * parts;
                 for (; i + Field::tileRows <= bottom; i += Field::tileRows) {
-                    AddToRows<Field, How, Field::tileRows>(terms, factor, place, panel, row, cStride,
-                                                         cols * parts);
+                    AddToRows<Field, How, Field::tileRows>(terms, factor, place, panel, row,
+                                                           cStride, cols * parts);
                     place.data += Field::tileRows * place.down;
                     row += Field::tileRows * cStride;
                 }
                 for (; i < bottom; ++i) {
-                    AddToRows<Field, How, 1>(terms, factor, place, panel, row, cStride, cols * parts);
+                    AddToRows<Field, How, 1>(terms, factor, place, panel, row, cStride,
+                                             cols * parts);
                     place.data += place.down;
                     row += cStride;
                 }
@@ -305,7 +304,7 @@ void AddPanel(std::ptrdiff_t rows, std::ptrdiff_t k, const DBL *slivers, const D
                                                  const DBL *b, DBL *to, std::ptrdiff_t stride,
                                                  std::ptrdiff_t doubles) {
         AddToRows<Field, Packed, Rows>(terms, {}, {sliver, parts, Rows * parts}, b, to, stride,
-                                           doubles);
+                                       doubles);
     };
     std::ptrdiff_t i = 0;
     for (; i + tileRows <= rows; i += tileRows)
@@ -314,9 +313,12 @@ void AddPanel(std::ptrdiff_t rows, std::ptrdiff_t k, const DBL *slivers, const D
     slivers += i * k * parts;
     c += i * cStride;
     switch (rows - i) {
-    case 1: return add.template operator()<1>(k, slivers, panel, c, cStride, width);
-    case 2: return add.template operator()<2>(k, slivers, panel, c, cStride, width);
-    case 3: return add.template operator()<3>(k, slivers, panel, c, cStride, width);
+    case 1:
+        return add.template operator()<1>(k, slivers, panel, c, cStride, width);
+    case 2:
+        return add.template operator()<2>(k, slivers, panel, c, cStride, width);
+    case 3:
+        return add.template operator()<3>(k, slivers, panel, c, cStride, width);
     }
 }
 
@@ -342,8 +344,8 @@ void AddLarge(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, Sign sign,
                 PackSlivers<Field>(From(a, i, p), rows, terms, sign, factor, slivers);
                 panel = panels;
                 for (std::ptrdiff_t j = left; j < right; j += tileCols, panel += panelSize)
-                    AddPanel<Field>(rows, terms, slivers, panel,
-                                    c + i * cStride + j * Field::parts, cStride,
+                    AddPanel<Field>(rows, terms, slivers, panel, c + i * cStride + j * Field::parts,
+                                    cStride,
                                     (right - j < tileCols ? right - j : tileCols) * Field::parts);
             }
         }

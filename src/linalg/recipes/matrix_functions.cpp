@@ -22,8 +22,7 @@ Recipe InPlace(const char *name, Export function) {
 template <ElementType Code, class Export>
 Recipe Power(std::string name, int32_t power, Export function) {
     return {name + ": power " + std::to_string(power),
-            [=](Call &c) { return function(c.inOut2D<Code>(0, c.n, c.n), power); }, None,
-            sizes};
+            [=](Call &c) { return function(c.inOut2D<Code>(0, c.n, c.n), power); }, None, sizes};
 }
 template <ElementType Code, class Export>
 Recipe PseudoInverse(const char *name, Export function) {
@@ -47,8 +46,8 @@ std::vector<Recipe> FunctionRecipes() {
         InPlace<CDB>("CxMatrixLn_head", CxMatrixLn_head),
         InPlace<DBL>("MatrixSqrt_head", MatrixSqrt_head),
         {"MatrixSqrtH",
-         [](Call &c) { return MatrixSqrtH(c.in2D<DBL>(0, c.n, c.n), c.out2D<CDB>(0)); },
-         None, sizes},
+         [](Call &c) { return MatrixSqrtH(c.in2D<DBL>(0, c.n, c.n), c.out2D<CDB>(0)); }, None,
+         sizes},
         InPlace<CDB>("CxMatrixSqrt_head", CxMatrixSqrt_head),
         PseudoInverse<DBL>("PseudoInverse_head", PseudoInverse_head),
         PseudoInverse<CDB>("CxPseudoInverse_head", CxPseudoInverse_head),

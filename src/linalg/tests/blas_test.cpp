@@ -52,8 +52,7 @@ template <class T>
 class Block {
 public:
     Block(std::ptrdiff_t rows, std::ptrdiff_t cols, std::ptrdiff_t leading, int seed)
-        : leading_(leading),
-          size_(rows > 0 && cols > 0 ? (cols - 1) * leading + rows : 0),
+        : leading_(leading), size_(rows > 0 && cols > 0 ? (cols - 1) * leading + rows : 0),
           memory_(new char[size_ * sizeof(T) + 8]) {
         const std::vector<T> values = Random<T>(static_cast<std::size_t>(size_), seed);
         if (size_ > 0)
@@ -266,8 +265,8 @@ TYPED_TEST(Blas, MatrixTimesVectorIsThatOfTheDefinition) {
 template <class T>
 void ExpectTriangular(char side, char uplo, char trans, char diag, int m, int n, T alpha,
                       bool solve) {
-    SCOPED_TRACE((std::string{side, uplo, trans, diag} + (solve ? " solve" : " multiply") +
-                  Sizes({m, n})));
+    SCOPED_TRACE(
+        (std::string{side, uplo, trans, diag} + (solve ? " solve" : " multiply") + Sizes({m, n})));
     const int order = side == 'L' ? m : n;
     Block<T> a(order, order, order + 2, 1), b(m, n, m + 1, 2), before(m, n, m + 1, 2);
     const int32_t lda = a.leading(), ldb = b.leading();
