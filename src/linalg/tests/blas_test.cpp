@@ -168,7 +168,8 @@ TYPED_TEST(Blas, ProductsAreThoseOfTheDefinition) {
             for (const T alpha : {one, minus, none, some})
                 for (const T beta : {one, minus, none, some}) {
                     ExpectProduct<T>(transA, transB, 6, 9, 3, alpha, beta);
-                    ExpectProduct<T>(transA, transB, 41, 22, 73, alpha, beta);
+                    if (transA == transB)
+                        ExpectProduct<T>(transA, transB, 41, 22, 73, alpha, beta);
                 }
             // Either side of the blocks of rows, of terms and of small products.
             ExpectProduct<T>(transA, transB, 97, 13, 65, one, one);
@@ -317,8 +318,8 @@ TYPED_TEST(Blas, TrianglesMultiplyAndSolve) {
                         for (const int m : {0, 1, 33})
                             for (const int n : {0, 1, 34})
                                 ExpectTriangular<T>(side, uplo, trans, diag, m, n, some, solve);
-                        ExpectTriangular<T>(side, uplo, trans, diag, side == 'L' ? 131 : 9,
-                                            side == 'L' ? 9 : 131, one, solve);
+                        ExpectTriangular<T>(side, uplo, trans, diag, side == 'L' ? 70 : 5,
+                                            side == 'L' ? 5 : 70, one, solve);
                     }
 }
 
