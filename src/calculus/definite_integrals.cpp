@@ -117,7 +117,7 @@ ErrorCode DefiniteIntegral(ConstRealVector x, double dt, int32_t rule, Remainder
     return 0;
 }
 
-ErrorCode DefiniteIntegral2D(ConstRealMatrix x, ConstRealVector dts, int32_t rule,
+ErrorCode DefiniteIntegral2D(const ConstRealMatrix &x, ConstRealVector dts, int32_t rule,
                              Remainder remainder, double *result) {
     if (const ErrorCode bad = FirstFailed({{x.rows() < 3 || x.cols() < 3, ErrSizesDisagree},
                                            {dts.size() < 2, ErrFewerThanTwo},

@@ -32,7 +32,7 @@ struct Volume {
 // ErrSamplingNotPositive are the frames'.
 ErrorCode DefiniteIntegral(ConstRealVector x, double dt, int32_t rule, Remainder remainder,
                            double *result);
-ErrorCode DefiniteIntegral2D(ConstRealMatrix x, ConstRealVector dts, int32_t rule,
+ErrorCode DefiniteIntegral2D(const ConstRealMatrix &x, ConstRealVector dts, int32_t rule,
                              Remainder remainder, double *result);
 ErrorCode DefiniteIntegral3D(const Volume &x, ConstRealVector dts, int32_t rule,
                              Remainder remainder, double *result);

@@ -15,7 +15,7 @@ namespace {
 // The upper triangle of a banded matrix with `band` diagonals and the target of each row.
 class BandedTriangle {
 public:
-    explicit BandedTriangle(RealMatrix elements)
+    explicit BandedTriangle(const RealMatrix &elements)
         : elements_(elements), order_(elements.rows()), band_(elements.cols() - 1) {
         for (DBL &element : elements.elements())
             element = 0.0;

@@ -39,14 +39,14 @@ void FindResiduals(const FitModel &model, const FitSamples &samples, RealVector 
         r[i] = samples.y[i] - model.value(samples.x[i], p.data(), model.count, model.user);
 }
 
-void MirrorLowerTriangle(RealMatrix a) {
+void MirrorLowerTriangle(const RealMatrix &a) {
     for (int32_t i = 0; i < a.rows(); ++i)
         for (int32_t j = 0; j < i; ++j)
             a(j, i) = a(i, j);
 }
 
 // row^T inverse row.
-double Leverage(const DBL *row, RealMatrix inverse) {
+double Leverage(const DBL *row, const RealMatrix &inverse) {
     double sum = 0.0;
     for (int32_t i = 0; i < inverse.rows(); ++i) {
         double product = 0.0;
@@ -69,7 +69,7 @@ ErrorCode EvaluationMemory::take(int32_t n) {
 }
 
 void EvalLeastSquares(const FitModel &model, const FitSamples &samples, FitPoint &at,
-                      EvaluationMemory &memory, RealMatrix jacobian) {
+                      EvaluationMemory &memory, const RealMatrix &jacobian) {
     const auto &[p, a, g, cost] = at;
     const int32_t count = model.count;
     if (model.normal != nullptr) {

@@ -64,7 +64,7 @@ private:
 // ErrNaNInData (a residual is NaN), ErrNonFiniteInput (a is not finite), ErrOutOfMemory,
 // ErrIterationLimit (the singular values of a do not converge).
 void EvalLeastSquares(const FitModel &model, const FitSamples &samples, FitPoint &at,
-                      EvaluationMemory &memory, RealMatrix jacobian = {});
+                      EvaluationMemory &memory, const RealMatrix &jacobian = {});
 ErrorCode EvalLeastAbsolute(const FitModel &model, const FitSamples &samples, FitPoint &at,
                             EvaluationMemory &memory);
 ErrorCode EvalBisquare(const FitModel &model, const FitSamples &samples, FitPoint &at,

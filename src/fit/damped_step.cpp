@@ -7,8 +7,8 @@
 
 namespace qx {
 
-ErrorCode SolveRowScaled(RealMatrix matrix, RealVector right, VectorView<ElementType::I32> order,
-                         RealVector solution) {
+ErrorCode SolveRowScaled(const RealMatrix &matrix, RealVector right,
+                         VectorView<ElementType::I32> order, RealVector solution) {
     const int32_t n = matrix.rows();
     DBL *const a = matrix.data(), *const g = right.data(), *const d = solution.data();
     I32 *const pivots = order.data();
@@ -31,7 +31,7 @@ ErrorCode SolveRowScaled(RealMatrix matrix, RealVector right, VectorView<Element
     return LUSolve<ElementType::DBL>({a, n, n}, {pivots, n}, {g, n, 1}, {d, n, 1});
 }
 
-ErrorCode AddDampedStep(RealMatrix a, RealVector g, double lambda, RealVector coefficients) {
+ErrorCode AddDampedStep(const RealMatrix &a, RealVector g, double lambda, RealVector coefficients) {
     for (int32_t i = 0; i < a.rows(); ++i) {
         a(i, i) *= 1.0 + lambda;
         if (!std::isfinite(a(i, i)))

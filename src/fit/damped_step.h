@@ -11,7 +11,7 @@ namespace qx {
 // are spoiled; pivots are work, and no memory is taken.
 //
 // ErrSingularMatrix.
-ErrorCode SolveRowScaled(RealMatrix a, RealVector g, VectorView<ElementType::I32> pivots,
+ErrorCode SolveRowScaled(const RealMatrix &a, RealVector g, VectorView<ElementType::I32> pivots,
                          RealVector d);
 
 // One damped step of a fit: a with its diagonal times 1 + lambda, solved for g, is added to the
@@ -19,7 +19,7 @@ ErrorCode SolveRowScaled(RealMatrix a, RealVector g, VectorView<ElementType::I32
 //
 // ErrNonFiniteInput (a diagonal element), ErrOutOfMemory, ErrSingularMatrix (also where a new
 // coefficient is NaN).
-ErrorCode AddDampedStep(RealMatrix a, RealVector g, double lambda, RealVector coefficients);
+ErrorCode AddDampedStep(const RealMatrix &a, RealVector g, double lambda, RealVector coefficients);
 
 } // namespace qx
 

@@ -199,8 +199,8 @@ ErrorCode SolveLinearModel(const LinearModel &model, int32_t method, DBL *c, DBL
     return SolveByTriangle(model, triangle, c, covariance);
 }
 
-ErrorCode FitGeneral(ConstRealMatrix h, const FitSamples &samples, int32_t algorithm, RealVector c,
-                     RealMatrix covariance, const FitOutput &out) {
+ErrorCode FitGeneral(const ConstRealMatrix &h, const FitSamples &samples, int32_t algorithm,
+                     RealVector c, const RealMatrix &covariance, const FitOutput &out) {
     const int32_t n = h.rows(), k = h.cols();
     const auto writeRows = [&](const RowBlock &block) {
         const auto bytes = static_cast<std::size_t>(block.count) * sizeof(DBL);
@@ -221,7 +221,7 @@ ErrorCode FitGeneral(ConstRealMatrix h, const FitSamples &samples, int32_t algor
     return 0;
 }
 
-ErrorCode SolveUpperTriangular(ConstRealMatrix r, ConstRealVector v, RealVector x) {
+ErrorCode SolveUpperTriangular(const ConstRealMatrix &r, ConstRealVector v, RealVector x) {
     for (std::ptrdiff_t i = r.rows() - 1; i >= 0; --i) {
         const DBL *const row = r.row(i);
         if (row[i] == 0.0 || row[i] != row[i])

@@ -28,12 +28,12 @@ ErrorCode SolveLinearModel(const LinearModel &model, int32_t method, DBL *c, DBL
 
 // The same for a matrix h of n rows and k columns, with the covariance where that is not empty, and
 // the values h c and their MSE.
-ErrorCode FitGeneral(ConstRealMatrix h, const FitSamples &samples, int32_t algorithm, RealVector c,
-                     RealMatrix covariance, const FitOutput &out);
+ErrorCode FitGeneral(const ConstRealMatrix &h, const FitSamples &samples, int32_t algorithm,
+                     RealVector c, const RealMatrix &covariance, const FitOutput &out);
 
 // Solves r x = v for the upper triangle of a square matrix; x may be v. ErrSingularMatrix where a
 // diagonal element is 0 or NaN.
-ErrorCode SolveUpperTriangular(ConstRealMatrix r, ConstRealVector v, RealVector x);
+ErrorCode SolveUpperTriangular(const ConstRealMatrix &r, ConstRealVector v, RealVector x);
 
 } // namespace qx
 

@@ -7,12 +7,15 @@
 #include <cstddef>
 #include <cstdint>
 #include <cstring>
+#include <type_traits>
 
 namespace qx {
 
-// Views of elements that somebody else owns: two to four words, handed on by value. Inner routines
-// take them in place of a pointer with its sizes. They are keyed by the element's code and not by
-// its C++ type, because a template argument would drop the alignment that the types carry.
+// Views of elements that somebody else owns. Inner routines take them in place of a pointer with
+// its sizes: vectors by value, which are two words in registers, and matrices by reference, because
+// a copy on the stack takes longer than many a small matrix. They are keyed by the element's code
+// and not by its C++ type, because a template argument would drop the alignment that the types
+// carry.
 //
 // VectorView<E> and MatrixView<E> may be written through, ConstVectorView<E> and ConstMatrixView<E>
 // may not; the former become the latter by themselves. Inner routines that are templates of E are
@@ -74,25 +77,15 @@ private:
     std::ptrdiff_t size_ = 0;
 };
 
-// Row after row; `stride` elements from a row to the next one.
-template <ElementType E, bool Writable>
-class BasicMatrixView {
+namespace detail {
+// What all views of matrices hold.
+class MatrixPlace {
 public:
-    typedef typename detail::ViewedElement<E, Writable>::type T;
-    static constexpr ElementType code = E;
-
-    BasicMatrixView() = default;
-    BasicMatrixView(T *data, int32_t rows, int32_t cols)
-        : BasicMatrixView(data, rows, cols, cols) {}
-    BasicMatrixView(T *data, int32_t rows, int32_t cols, std::ptrdiff_t stride)
-        : data_(data), rows_(rows), cols_(cols), stride_(stride) {
+    MatrixPlace() = default;
+    MatrixPlace(const void *data, int32_t rows, int32_t cols, std::ptrdiff_t stride)
+        : data_(const_cast<void *>(data)), rows_(rows), cols_(cols), stride_(stride) {
         QX_EXPECTS(rows >= 0 && cols >= 0 && stride >= cols);
     }
-    operator BasicMatrixView<E, false>() const requires Writable {
-        return {data_, rows_, cols_, stride_};
-    }
-
-    T *data() const { return data_; }
     int32_t rows() const { return rows_; }
     int32_t cols() const { return cols_; }
     std::ptrdiff_t stride() const { return stride_; }
@@ -102,24 +95,47 @@ public:
     bool isWhole() const { return stride_ == cols_; }
     int64_t count() const { return int64_t{rows_} * cols_; }
 
-    T *row(std::ptrdiff_t i) const { return data_ + i * stride_; }
-    T &operator()(std::ptrdiff_t i, std::ptrdiff_t j) const { return data_[i * stride_ + j]; }
+protected:
+    void *data_ = nullptr;
+
+private:
+    int32_t rows_ = 0, cols_ = 0;
+    std::ptrdiff_t stride_ = 0;
+};
+} // namespace detail
+
+// Row after row; `stride` elements from a row to the next one. A view that may be written through
+// is a constant one too, so that a function takes it by reference without a copy.
+template <ElementType E, bool Writable>
+class BasicMatrixView
+    : public std::conditional_t<Writable, BasicMatrixView<E, false>, detail::MatrixPlace> {
+    typedef std::conditional_t<Writable, BasicMatrixView<E, false>, detail::MatrixPlace> Base;
+
+public:
+    typedef typename detail::ViewedElement<E, Writable>::type T;
+    static constexpr ElementType code = E;
+
+    BasicMatrixView() = default;
+    BasicMatrixView(T *data, int32_t rows, int32_t cols) : Base(data, rows, cols, cols) {}
+    BasicMatrixView(T *data, int32_t rows, int32_t cols, std::ptrdiff_t stride)
+        : Base(data, rows, cols, stride) {}
+
+    T *data() const { return static_cast<T *>(this->data_); }
+    T *row(std::ptrdiff_t i) const { return data() + i * this->stride(); }
+    T &operator()(std::ptrdiff_t i, std::ptrdiff_t j) const {
+        return data()[i * this->stride() + j];
+    }
 
     // The matrix of `rows` by `cols` whose first element is (i, j).
     BasicMatrixView block(int32_t i, int32_t j, int32_t rows, int32_t cols) const {
-        QX_EXPECTS(i >= 0 && j >= 0 && i + rows <= rows_ && j + cols <= cols_);
-        return {data_ + i * stride_ + j, rows, cols, stride_};
+        QX_EXPECTS(i >= 0 && j >= 0 && i + rows <= this->rows() && j + cols <= this->cols());
+        return {row(i) + j, rows, cols, this->stride()};
     }
     // All elements of a matrix that is whole.
     BasicVectorView<E, Writable> elements() const {
-        QX_EXPECTS(isWhole());
-        return {data_, static_cast<std::ptrdiff_t>(count())};
+        QX_EXPECTS(this->isWhole());
+        return {data(), static_cast<std::ptrdiff_t>(this->count())};
     }
-
-private:
-    T *data_ = nullptr;
-    int32_t rows_ = 0, cols_ = 0;
-    std::ptrdiff_t stride_ = 0;
 };
 
 template <ElementType E>

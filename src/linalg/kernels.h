@@ -62,7 +62,7 @@ QX_BY_WIDTH(void, ReflectColumns,
 
 // The first three for either element. x and y have as many elements as a has rows or columns.
 template <ElementType E>
-void AddTransposedProduct(ConstMatrixView<E> a, ConstVectorView<E> x, VectorView<E> y) {
+void AddTransposedProduct(const ConstMatrixView<E> &a, ConstVectorView<E> x, VectorView<E> y) {
     QX_EXPECTS(x.size() == a.rows() && y.size() == a.cols());
     if constexpr (E == ElementType::DBL)
         AddTransposedProductReal(a.data(), a.stride(), a.rows(), a.cols(), x.data(), y.data());
@@ -70,7 +70,7 @@ void AddTransposedProduct(ConstMatrixView<E> a, ConstVectorView<E> x, VectorView
         AddTransposedProductComplex(a.data(), a.stride(), a.rows(), a.cols(), x.data(), y.data());
 }
 template <ElementType E>
-void AddOuterProduct(MatrixView<E> a, ConstVectorView<E> x, ConstVectorView<E> y) {
+void AddOuterProduct(const MatrixView<E> &a, ConstVectorView<E> x, ConstVectorView<E> y) {
     QX_EXPECTS(x.size() == a.rows() && y.size() == a.cols());
     if constexpr (E == ElementType::DBL)
         AddOuterProductReal(a.data(), a.stride(), a.rows(), a.cols(), x.data(), y.data());
@@ -78,7 +78,7 @@ void AddOuterProduct(MatrixView<E> a, ConstVectorView<E> x, ConstVectorView<E> y
         AddOuterProductComplex(a.data(), a.stride(), a.rows(), a.cols(), x.data(), y.data());
 }
 template <ElementType E>
-void RowProducts(ConstMatrixView<E> a, ConstVectorView<E> x, VectorView<E> y) {
+void RowProducts(const ConstMatrixView<E> &a, ConstVectorView<E> x, VectorView<E> y) {
     QX_EXPECTS(x.size() == a.cols() && y.size() == a.rows());
     if constexpr (E == ElementType::DBL)
         RowProductsReal(a.data(), a.stride(), a.rows(), a.cols(), x.data(), y.data());

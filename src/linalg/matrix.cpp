@@ -40,7 +40,7 @@ bool AllFinite(ConstVectorView<E> x) {
 }
 
 template <ElementType E>
-bool AllFinite(ConstMatrixView<E> a) {
+bool AllFinite(const ConstMatrixView<E> &a) {
     if (a.isWhole())
         return AllFinite<E>(a.elements());
     for (int32_t i = 0; i < a.rows(); ++i)
@@ -50,14 +50,14 @@ bool AllFinite(ConstMatrixView<E> a) {
 }
 
 template <ElementType E>
-void CopyMatrix(ConstMatrixView<E> from, MatrixView<E> to) {
+void CopyMatrix(const ConstMatrixView<E> &from, const MatrixView<E> &to) {
     QX_EXPECTS(to.rows() == from.rows() && to.cols() == from.cols());
     for (int32_t i = 0; i < from.rows(); ++i)
         Copy<E>({from.row(i), from.cols()}, {to.row(i), to.cols()});
 }
 
 template <ElementType E>
-void CopyTransposed(ConstMatrixView<E> from, MatrixView<E> to) {
+void CopyTransposed(const ConstMatrixView<E> &from, const MatrixView<E> &to) {
     QX_EXPECTS(to.rows() == from.cols() && to.cols() == from.rows());
     for (int32_t top = 0; top < from.rows(); top += rowsAtOnce) {
         const int32_t bottom = std::min(top + rowsAtOnce, from.rows());
@@ -68,7 +68,7 @@ void CopyTransposed(ConstMatrixView<E> from, MatrixView<E> to) {
 }
 
 template <ElementType E>
-void SetIdentity(MatrixView<E> a) {
+void SetIdentity(const MatrixView<E> &a) {
     for (int32_t i = 0; i < a.rows(); ++i)
         for (int32_t j = 0; j < a.cols(); ++j)
             a(i, j) = ScalarOf<E>::Of(i == j ? 1.0 : 0.0);
@@ -82,7 +82,7 @@ int32_t OrderOfPacked(int64_t length) {
 }
 
 template <ElementType E>
-void PackMatrix(ConstMatrixView<E> a, Triangle triangle, VectorView<E> packed) {
+void PackMatrix(const ConstMatrixView<E> &a, Triangle triangle, VectorView<E> packed) {
     QX_EXPECTS(a.isSquare() && packed.size() >= PackedLength(a.rows()));
     ForEachPacked(a.rows(), triangle, [=](std::ptrdiff_t i, std::ptrdiff_t j, std::ptrdiff_t at) {
         packed[at] = a(i, j);
@@ -90,7 +90,7 @@ void PackMatrix(ConstMatrixView<E> a, Triangle triangle, VectorView<E> packed) {
 }
 
 template <ElementType E>
-void ExpandPacked(ConstVectorView<E> packed, Triangle triangle, MatrixView<E> a) {
+void ExpandPacked(ConstVectorView<E> packed, Triangle triangle, const MatrixView<E> &a) {
     QX_EXPECTS(a.isSquare() && packed.size() >= PackedLength(a.rows()));
     ForEachPacked(a.rows(), triangle, [=](std::ptrdiff_t i, std::ptrdiff_t j, std::ptrdiff_t at) {
         // The mirror image first: on the diagonal the element itself stays.
@@ -106,17 +106,17 @@ void ExpandPacked(ConstVectorView<E> packed, Triangle triangle, MatrixView<E> a)
 
 template bool AllFinite(ConstRealVector);
 template bool AllFinite(ConstComplexVector);
-template bool AllFinite(ConstRealMatrix);
-template bool AllFinite(ConstComplexMatrix);
-template void CopyMatrix(ConstRealMatrix, RealMatrix);
-template void CopyMatrix(ConstComplexMatrix, ComplexMatrix);
-template void CopyTransposed(ConstRealMatrix, RealMatrix);
-template void CopyTransposed(ConstComplexMatrix, ComplexMatrix);
-template void SetIdentity(RealMatrix);
-template void SetIdentity(ComplexMatrix);
-template void PackMatrix(ConstRealMatrix, Triangle, RealVector);
-template void PackMatrix(ConstComplexMatrix, Triangle, ComplexVector);
-template void ExpandPacked(ConstRealVector, Triangle, RealMatrix);
-template void ExpandPacked(ConstComplexVector, Triangle, ComplexMatrix);
+template bool AllFinite(const ConstRealMatrix &);
+template bool AllFinite(const ConstComplexMatrix &);
+template void CopyMatrix(const ConstRealMatrix &, const RealMatrix &);
+template void CopyMatrix(const ConstComplexMatrix &, const ComplexMatrix &);
+template void CopyTransposed(const ConstRealMatrix &, const RealMatrix &);
+template void CopyTransposed(const ConstComplexMatrix &, const ComplexMatrix &);
+template void SetIdentity(const RealMatrix &);
+template void SetIdentity(const ComplexMatrix &);
+template void PackMatrix(const ConstRealMatrix &, Triangle, RealVector);
+template void PackMatrix(const ConstComplexMatrix &, Triangle, ComplexVector);
+template void ExpandPacked(ConstRealVector, Triangle, const RealMatrix &);
+template void ExpandPacked(ConstComplexVector, Triangle, const ComplexMatrix &);
 
 } // namespace qx

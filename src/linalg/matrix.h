@@ -28,7 +28,7 @@ BasicMatrixView<E, Writable> AsRow(BasicVectorView<E, Writable> x) {
 }
 // A matrix as the real numbers that its elements are made of.
 template <ElementType E>
-RealMatrix PartsOf(MatrixView<E> a) {
+RealMatrix PartsOf(const MatrixView<E> &a) {
     return {reinterpret_cast<DBL *>(a.data()), a.rows(), a.cols() * partsOf<E>,
             a.stride() * partsOf<E>};
 }
@@ -38,17 +38,17 @@ RealMatrix PartsOf(MatrixView<E> a) {
 template <ElementType E>
 bool AllFinite(ConstVectorView<E> x);
 template <ElementType E>
-bool AllFinite(ConstMatrixView<E> a);
+bool AllFinite(const ConstMatrixView<E> &a);
 // The same for n numbers: 0, or 1 where one is refused.
 ErrorCode CheckFinite(const DBL *x, int64_t n);
 
 template <ElementType E>
-void CopyMatrix(ConstMatrixView<E> from, MatrixView<E> to);
+void CopyMatrix(const ConstMatrixView<E> &from, const MatrixView<E> &to);
 // to[j][i] = from[i][j], without conjugation.
 template <ElementType E>
-void CopyTransposed(ConstMatrixView<E> from, MatrixView<E> to);
+void CopyTransposed(const ConstMatrixView<E> &from, const MatrixView<E> &to);
 template <ElementType E>
-void SetIdentity(MatrixView<E> a);
+void SetIdentity(const MatrixView<E> &a);
 
 // Packed triangular storage of a matrix of order n: n(n+1)/2 elements, column after column of the
 // lower triangle (rows j to n-1) or of the upper one (rows 0 to j).
@@ -61,9 +61,9 @@ int32_t OrderOfPacked(int64_t length);
 // expanding fills the other triangle with zeros, or with its mirror image, which is conjugated in a
 // Hermitian matrix.
 template <ElementType E>
-void PackMatrix(ConstMatrixView<E> a, Triangle triangle, VectorView<E> packed);
+void PackMatrix(const ConstMatrixView<E> &a, Triangle triangle, VectorView<E> packed);
 template <ElementType E>
-void ExpandPacked(ConstVectorView<E> packed, Triangle triangle, MatrixView<E> a);
+void ExpandPacked(ConstVectorView<E> packed, Triangle triangle, const MatrixView<E> &a);
 
 // The distance of rows in scratch matrices: an odd number of cache lines, because with rows a
 // power of two apart a column falls into few sets of the cache.

@@ -17,7 +17,7 @@ class MatrixPolynomial {
     typedef ElementOf<E> T;
 
 public:
-    MatrixPolynomial(ConstVectorView<E> p, ConstMatrixView<E> a)
+    MatrixPolynomial(ConstVectorView<E> p, const ConstMatrixView<E> &a)
         : p_(p), a_(a.data()), order_(a.rows()), elements_(a.count()),
           degree_(std::max(0, LengthWithoutZeros<E>(p) - 1)) {}
 
@@ -78,12 +78,14 @@ private:
 } // namespace
 
 template <ElementType E>
-ErrorCode EvaluateAtMatrix(ConstVectorView<E> p, ConstMatrixView<E> a, MatrixView<E> y) {
+ErrorCode EvaluateAtMatrix(ConstVectorView<E> p, const ConstMatrixView<E> &a,
+                           const MatrixView<E> &y) {
     QX_EXPECTS(a.isSquare() && a.isWhole() && y.count() == a.count() && y.isWhole());
     return MatrixPolynomial<E>(p, a).evaluate(y.data());
 }
 
-template ErrorCode EvaluateAtMatrix(ConstRealVector, ConstRealMatrix, RealMatrix);
-template ErrorCode EvaluateAtMatrix(ConstComplexVector, ConstComplexMatrix, ComplexMatrix);
+template ErrorCode EvaluateAtMatrix(ConstRealVector, const ConstRealMatrix &, const RealMatrix &);
+template ErrorCode EvaluateAtMatrix(ConstComplexVector, const ConstComplexMatrix &,
+                                    const ComplexMatrix &);
 
 } // namespace qx

@@ -22,7 +22,8 @@ QX_BY_WIDTH(void, EvaluateComplex,
 // Source: M. S. Paterson and L. J. Stockmeyer, On the number of nonscalar multiplications necessary
 // to evaluate polynomials, 1973.
 template <ElementType E>
-ErrorCode EvaluateAtMatrix(ConstVectorView<E> p, ConstMatrixView<E> a, MatrixView<E> y);
+ErrorCode EvaluateAtMatrix(ConstVectorView<E> p, const ConstMatrixView<E> &a,
+                           const MatrixView<E> &y);
 
 } // namespace qx
 

@@ -28,11 +28,11 @@ ErrorCode Forward(const Plans &plans, const DBL *x, const MatrixRegion &region, 
 ErrorCode Forward(const Plans &plans, const CDB *x, const MatrixRegion &region, CDB *spectrum) {
     return FFT2DComplexForward(plans.ofRows.get(), plans.ofColumns.get(), x, region, 0, spectrum);
 }
-ErrorCode Inverse(const Plans &plans, const CDB *spectrum, RealMatrix out) {
+ErrorCode Inverse(const Plans &plans, const CDB *spectrum, const RealMatrix &out) {
     return FFT2DRealInverse(plans.ofRows.get(), plans.ofColumns.get(), spectrum, out.rows(),
                             out.cols(), 0, out.data());
 }
-ErrorCode Inverse(const Plans &plans, const CDB *spectrum, ComplexMatrix out) {
+ErrorCode Inverse(const Plans &plans, const CDB *spectrum, const ComplexMatrix &out) {
     return FFT2DComplexInverse(plans.ofRows.get(), plans.ofColumns.get(), spectrum, out.rows(),
                                out.cols(), 0, out.data());
 }
@@ -41,7 +41,8 @@ CDB Conjugate(const CDB &value) { return {value.re, -value.im}; }
 
 // Row by row of the result: a sliding sum over the rows of the kernel that reach it.
 template <ElementType E>
-void ConvolveDirectly2D(ConstMatrixView<E> big, ConstMatrixView<E> kernel, MatrixView<E> out) {
+void ConvolveDirectly2D(const ConstMatrixView<E> &big, const ConstMatrixView<E> &kernel,
+                        const MatrixView<E> &out) {
     const std::ptrdiff_t cols = out.cols();
     for (std::ptrdiff_t r = 0; r < out.rows(); ++r) {
         const std::ptrdiff_t low = std::max<std::ptrdiff_t>(0, r - big.rows() + 1);
@@ -61,7 +62,8 @@ void ConvolveDirectly2D(ConstMatrixView<E> big, ConstMatrixView<E> kernel, Matri
 
 // The transforms have exactly the size of the result.
 template <ElementType E>
-ErrorCode ConvolveByTransform2D(ConstMatrixView<E> x, ConstMatrixView<E> y, MatrixView<E> out) {
+ErrorCode ConvolveByTransform2D(const ConstMatrixView<E> &x, const ConstMatrixView<E> &y,
+                                const MatrixView<E> &out) {
     const std::ptrdiff_t count = out.elements().size();
     Scratch<ElementType::CDB> spectra;
     if (const ErrorCode failed = spectra.allocate(2 * int64_t{count}))
@@ -71,7 +73,7 @@ ErrorCode ConvolveByTransform2D(ConstMatrixView<E> x, ConstMatrixView<E> y, Matr
         return ErrOutOfMemory;
     CDB *const first = spectra.data();
     CDB *const second = first + count;
-    const auto transform = [&](ConstMatrixView<E> from, CDB *to) {
+    const auto transform = [&](const ConstMatrixView<E> &from, CDB *to) {
         return Forward(plans, from.data(), {from.rows(), from.cols(), 0, 0, out.rows(), out.cols()},
                        to);
     };
@@ -85,8 +87,8 @@ ErrorCode ConvolveByTransform2D(ConstMatrixView<E> x, ConstMatrixView<E> y, Matr
 }
 
 template <ElementType E>
-ErrorCode ConvolveFull(ConstMatrixView<E> x, ConstMatrixView<E> y, int32_t algorithm,
-                       MatrixView<E> out) {
+ErrorCode ConvolveFull(const ConstMatrixView<E> &x, const ConstMatrixView<E> &y, int32_t algorithm,
+                       const MatrixView<E> &out) {
     if (algorithm == ConvolveByTransform)
         return ConvolveByTransform2D(x, y, out);
     if (algorithm != ConvolveDirectly)
@@ -101,8 +103,8 @@ ErrorCode ConvolveFull(ConstMatrixView<E> x, ConstMatrixView<E> y, int32_t algor
 } // namespace
 
 template <ElementType E>
-ErrorCode Convolve2D(ConstMatrixView<E> x, ConstMatrixView<E> y, OutputSize outputSize,
-                     int32_t algorithm, MatrixView<E> out) {
+ErrorCode Convolve2D(const ConstMatrixView<E> &x, const ConstMatrixView<E> &y,
+                     OutputSize outputSize, int32_t algorithm, const MatrixView<E> &out) {
     QX_EXPECTS(!x.isEmpty() && !y.isEmpty() && x.isWhole() && y.isWhole() && out.isWhole());
     const bool valid = outputSize == ValidPart;
     if constexpr (E == ElementType::CDB)
@@ -133,8 +135,8 @@ ErrorCode Convolve2D(ConstMatrixView<E> x, ConstMatrixView<E> y, OutputSize outp
 }
 
 template <ElementType E>
-ErrorCode Correlate2D(ConstMatrixView<E> x, ConstMatrixView<E> y, int32_t algorithm,
-                      MatrixView<E> out) {
+ErrorCode Correlate2D(const ConstMatrixView<E> &x, const ConstMatrixView<E> &y, int32_t algorithm,
+                      const MatrixView<E> &out) {
     MatrixView<E> turned;
     ScratchParts memory;
     if (const ErrorCode failed = memory.take(Sized(turned, x.rows(), x.cols())))
@@ -148,9 +150,10 @@ ErrorCode Correlate2D(ConstMatrixView<E> x, ConstMatrixView<E> y, int32_t algori
 }
 
 #define QX_INSTANTIATE(E)                                                                          \
-    template ErrorCode Convolve2D(ConstMatrixView<E>, ConstMatrixView<E>, OutputSize, int32_t,     \
-                                  MatrixView<E>);                                                  \
-    template ErrorCode Correlate2D(ConstMatrixView<E>, ConstMatrixView<E>, int32_t, MatrixView<E>);
+    template ErrorCode Convolve2D(const ConstMatrixView<E> &, const ConstMatrixView<E> &,          \
+                                  OutputSize, int32_t, const MatrixView<E> &);                     \
+    template ErrorCode Correlate2D(const ConstMatrixView<E> &, const ConstMatrixView<E> &,         \
+                                   int32_t, const MatrixView<E> &);
 
 QX_INSTANTIATE(ElementType::DBL)
 QX_INSTANTIATE(ElementType::CDB)

@@ -22,14 +22,14 @@ enum OutputSize : int32_t {
 // out has the size that is asked for.
 // kept: ValidPart with a complex x or y that is wider than tall gives ErrSizesDisagree, fit or not.
 template <ElementType E>
-ErrorCode Convolve2D(ConstMatrixView<E> x, ConstMatrixView<E> y, OutputSize outputSize,
-                     int32_t algorithm, MatrixView<E> out);
+ErrorCode Convolve2D(const ConstMatrixView<E> &x, const ConstMatrixView<E> &y,
+                     OutputSize outputSize, int32_t algorithm, const MatrixView<E> &out);
 
 // The convolution, of full size, of x turned by 180 degrees (and conjugated) with y: element
 // (x.rows() - 1, x.cols() - 1) is lag zero.
 template <ElementType E>
-ErrorCode Correlate2D(ConstMatrixView<E> x, ConstMatrixView<E> y, int32_t algorithm,
-                      MatrixView<E> out);
+ErrorCode Correlate2D(const ConstMatrixView<E> &x, const ConstMatrixView<E> &y, int32_t algorithm,
+                      const MatrixView<E> &out);
 
 } // namespace qx
 

@@ -26,7 +26,7 @@ struct WorkBlock {
 
 // transform(const DBL *in, DBL *out) for each row.
 template <class Transform>
-ErrorCode TransformRows(ConstRealMatrix in, RealMatrix out, Transform transform) {
+ErrorCode TransformRows(const ConstRealMatrix &in, const RealMatrix &out, Transform transform) {
     for (std::ptrdiff_t r = 0; r < in.rows(); ++r)
         if (const ErrorCode failed = transform(in.row(r), out.row(r)))
             return failed;
@@ -34,7 +34,8 @@ ErrorCode TransformRows(ConstRealMatrix in, RealMatrix out, Transform transform)
 }
 
 template <class Transform>
-ErrorCode TransformColumns(ConstRealMatrix in, RealMatrix out, DBL *columns, Transform transform) {
+ErrorCode TransformColumns(const ConstRealMatrix &in, const RealMatrix &out, DBL *columns,
+                           Transform transform) {
     const int32_t rows = in.rows(), cols = in.cols();
     const int64_t pitch = PaddedPitch(rows);
     for (int32_t c = 0; c < cols; c += ColumnsAtOnce) {
@@ -50,9 +51,9 @@ ErrorCode TransformColumns(ConstRealMatrix in, RealMatrix out, DBL *columns, Tra
 
 // `transform` makes one transform of n values: plan, from, to, n.
 template <class Transform>
-ErrorCode InBothDirections(const FFTPlan *columnPlan, const FFTPlan *rowPlan, ConstRealMatrix in,
-                           RealMatrix out, bool columnsFirst, DBL *columns,
-                           const Transform &transform) {
+ErrorCode InBothDirections(const FFTPlan *columnPlan, const FFTPlan *rowPlan,
+                           const ConstRealMatrix &in, const RealMatrix &out, bool columnsFirst,
+                           DBL *columns, const Transform &transform) {
     QX_EXPECTS(in.isWhole() && out.isWhole() && in.rows() == out.rows() && in.cols() == out.cols());
     const auto along = [&](const FFTPlan *plan, int32_t n) {
         return [=, &transform](const DBL *from, DBL *to) { return transform(plan, from, to, n); };
@@ -71,7 +72,7 @@ ErrorCode InBothDirections(const FFTPlan *columnPlan, const FFTPlan *rowPlan, Co
 
 } // namespace
 
-ErrorCode MatrixWindow::take(ConstRealMatrix in, int32_t rows, int32_t cols) {
+ErrorCode MatrixWindow::take(const ConstRealMatrix &in, int32_t rows, int32_t cols) {
     view = in;
     if (rows == in.rows() && cols == in.cols())
         return 0;
@@ -86,8 +87,8 @@ ErrorCode MatrixWindow::take(ConstRealMatrix in, int32_t rows, int32_t cols) {
 }
 
 template <class Transform>
-ErrorCode SeparableForward(const FFTPlan *columnPlan, const FFTPlan *rowPlan, ConstRealMatrix in,
-                           RealMatrix out) {
+ErrorCode SeparableForward(const FFTPlan *columnPlan, const FFTPlan *rowPlan,
+                           const ConstRealMatrix &in, const RealMatrix &out) {
     WorkBlock work;
     if (const ErrorCode failed = work.take(Transform::forwardWork(in.rows()),
                                            Transform::forwardWork(in.cols()), in.rows()))
@@ -100,8 +101,8 @@ ErrorCode SeparableForward(const FFTPlan *columnPlan, const FFTPlan *rowPlan, Co
 }
 
 template <class Transform>
-ErrorCode SeparableInverse(const FFTPlan *columnPlan, const FFTPlan *rowPlan, ConstRealMatrix in,
-                           RealMatrix out) {
+ErrorCode SeparableInverse(const FFTPlan *columnPlan, const FFTPlan *rowPlan,
+                           const ConstRealMatrix &in, const RealMatrix &out) {
     WorkBlock work;
     if (const ErrorCode failed = work.take(Transform::inverseWork(in.rows()),
                                            Transform::inverseWork(in.cols()), in.rows()))
@@ -115,9 +116,9 @@ ErrorCode SeparableInverse(const FFTPlan *columnPlan, const FFTPlan *rowPlan, Co
 
 #define QX_INSTANTIATE(Transform)                                                                  \
     template ErrorCode SeparableForward<Transform>(const FFTPlan *, const FFTPlan *,               \
-                                                   ConstRealMatrix, RealMatrix);                   \
+                                                   const ConstRealMatrix &, const RealMatrix &);   \
     template ErrorCode SeparableInverse<Transform>(const FFTPlan *, const FFTPlan *,               \
-                                                   ConstRealMatrix, RealMatrix);
+                                                   const ConstRealMatrix &, const RealMatrix &);
 
 QX_INSTANTIATE(CosineTransform)
 QX_INSTANTIATE(SineTransform)

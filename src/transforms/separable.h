@@ -38,17 +38,17 @@ struct MatrixWindow {
     ConstRealMatrix view;
     HeapBlock<ElementType::DBL> copy;
 
-    ErrorCode take(ConstRealMatrix in, int32_t rows, int32_t cols);
+    ErrorCode take(const ConstRealMatrix &in, int32_t rows, int32_t cols);
 };
 
 // Matrices of one size; columnPlan serves the transforms of the columns, rowPlan those of the rows.
 // The codes of the 1-D routines.
 template <class Transform>
-ErrorCode SeparableForward(const FFTPlan *columnPlan, const FFTPlan *rowPlan, ConstRealMatrix in,
-                           RealMatrix out);
+ErrorCode SeparableForward(const FFTPlan *columnPlan, const FFTPlan *rowPlan,
+                           const ConstRealMatrix &in, const RealMatrix &out);
 template <class Transform>
-ErrorCode SeparableInverse(const FFTPlan *columnPlan, const FFTPlan *rowPlan, ConstRealMatrix in,
-                           RealMatrix out);
+ErrorCode SeparableInverse(const FFTPlan *columnPlan, const FFTPlan *rowPlan,
+                           const ConstRealMatrix &in, const RealMatrix &out);
 
 } // namespace qx
 

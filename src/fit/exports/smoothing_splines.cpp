@@ -39,7 +39,7 @@ ErrorCode CheckSmoothing(In<DBL1D> x, In<DBL1D> y, In<DBL1D> d, int32_t method, 
 
 // Each piece in powers of x - x[i].
 void FindPieces(ConstRealVector x, ConstRealVector values, ConstRealVector second,
-                RealMatrix pieces) {
+                const RealMatrix &pieces) {
     for (int32_t i = 0; i < pieces.rows(); ++i) {
         const double h = x[i + 1] - x[i];
         DBL *const piece = pieces.row(i);

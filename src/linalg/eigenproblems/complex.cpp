@@ -14,7 +14,8 @@ constexpr auto E = ElementType::CDB;
 
 class ComplexEigenproblem {
 public:
-    ErrorCode solve(ConstComplexMatrix a, ComplexVector values, ComplexMatrix vectors) {
+    ErrorCode solve(const ConstComplexMatrix &a, ComplexVector values,
+                    const ComplexMatrix &vectors) {
         n_ = a.rows();
         const int32_t order = vectors.isEmpty() ? 0 : n_; // of the matrices for vectors
         ComplexMatrix q;
@@ -40,7 +41,7 @@ public:
     }
 
 private:
-    void writeVectors(Balanced range, ComplexMatrix vectors) {
+    void writeVectors(Balanced range, const ComplexMatrix &vectors) {
         double norm = 0.0;
         for (int32_t i = 0; i < n_; ++i)
             for (int32_t j = i; j < n_; ++j)
@@ -96,14 +97,16 @@ private:
 } // namespace
 
 template <>
-ErrorCode EigenGeneral(ConstComplexMatrix a, ComplexVector values, ComplexMatrix vectors) {
+ErrorCode EigenGeneral(const ConstComplexMatrix &a, ComplexVector values,
+                       const ComplexMatrix &vectors) {
     QX_EXPECTS(a.isSquare() && !a.isEmpty() && values.size() == a.rows());
     if (!AllFinite<E>(a))
         return ErrNonFiniteInput;
     return ComplexEigenproblem().solve(a, values, vectors);
 }
 
-ErrorCode EigenHermitian(ConstComplexMatrix a, ComplexVector values, ComplexMatrix vectors) {
+ErrorCode EigenHermitian(const ConstComplexMatrix &a, ComplexVector values,
+                         const ComplexMatrix &vectors) {
     RealVector real;
     ScratchParts memory;
     if (const ErrorCode failed = memory.take(Sized(real, a.rows())))

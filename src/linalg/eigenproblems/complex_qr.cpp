@@ -30,7 +30,8 @@ struct ComplexRotation {
 
 class ComplexQR {
 public:
-    ComplexQR(ComplexMatrix h, Balanced range, double negligible, ComplexMatrix transposed)
+    ComplexQR(const ComplexMatrix &h, Balanced range, double negligible,
+              const ComplexMatrix &transposed)
         : h_(h), n_(h.rows()), range_(range), negligible_(negligible), transposed_(transposed) {}
 
     ErrorCode run(ComplexVector values) {
@@ -130,8 +131,8 @@ private:
 
 } // namespace
 
-ErrorCode ComplexSchurIteration(ComplexMatrix h, Balanced range, double negligible,
-                                ComplexVector values, ComplexMatrix transposed) {
+ErrorCode ComplexSchurIteration(const ComplexMatrix &h, Balanced range, double negligible,
+                                ComplexVector values, const ComplexMatrix &transposed) {
     return ComplexQR(h, range, negligible, transposed).run(values);
 }
 

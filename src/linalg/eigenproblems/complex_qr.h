@@ -11,8 +11,8 @@ namespace qx {
 // `transposed` its transposed vectors; without it only the values come out. An element beside the
 // diagonal counts as 0 where it is within eps of its neighbours or at most `negligible`.
 // ErrIterationLimit.
-ErrorCode ComplexSchurIteration(ComplexMatrix h, Balanced range, double negligible,
-                                ComplexVector values, ComplexMatrix transposed);
+ErrorCode ComplexSchurIteration(const ComplexMatrix &h, Balanced range, double negligible,
+                                ComplexVector values, const ComplexMatrix &transposed);
 
 } // namespace qx
 

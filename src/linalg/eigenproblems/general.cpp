@@ -18,7 +18,7 @@ constexpr auto E = ElementType::DBL;
 // and y are the real and the imaginary part of a vector, of which elements 0 to `last` are not 0.
 class QuasiTriangular {
 public:
-    QuasiTriangular(ConstRealMatrix t, double norm, ConstComplexVector values, RealVector x,
+    QuasiTriangular(const ConstRealMatrix &t, double norm, ConstComplexVector values, RealVector x,
                     RealVector y)
         : t_(t), norm_(norm > 0.0 ? norm : 1.0), values_(values), x_(x), y_(y) {}
 
@@ -142,7 +142,7 @@ private:
 
 class RealEigenproblem {
 public:
-    ErrorCode solve(ConstRealMatrix a, ComplexVector values, ComplexMatrix vectors) {
+    ErrorCode solve(const ConstRealMatrix &a, ComplexVector values, const ComplexMatrix &vectors) {
         n_ = a.rows();
         const int32_t order = vectors.isEmpty() ? 0 : n_; // of the matrices for vectors
         RealMatrix q;
@@ -170,7 +170,7 @@ public:
 
 private:
     void writeVectors(double norm, Balanced range, ConstComplexVector values,
-                      ComplexMatrix vectors) {
+                      const ComplexMatrix &vectors) {
         QuasiTriangular triangle(matrix_, norm, values, x_, y_);
         for (int32_t j = n_ - 1; j >= 0; --j) {
             const bool isPair = values[j].im < 0.0;
@@ -220,7 +220,8 @@ private:
 } // namespace
 
 template <>
-ErrorCode EigenGeneral(ConstRealMatrix a, ComplexVector values, ComplexMatrix vectors) {
+ErrorCode EigenGeneral(const ConstRealMatrix &a, ComplexVector values,
+                       const ComplexMatrix &vectors) {
     QX_EXPECTS(a.isSquare() && !a.isEmpty() && values.size() == a.rows());
     if (!AllFinite<E>(a))
         return ErrNonFiniteInput;

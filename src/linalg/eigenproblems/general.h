@@ -19,15 +19,19 @@ enum EigenMatrix : int32_t { generalMatrix = 0, hermitianMatrix = 1 };
 //
 // ErrNonFiniteInput, ErrOutOfMemory, ErrIterationLimit.
 template <ElementType E>
-ErrorCode EigenGeneral(ConstMatrixView<E> a, ComplexVector values, ComplexMatrix vectors = {});
+ErrorCode EigenGeneral(const ConstMatrixView<E> &a, ComplexVector values,
+                       const ComplexMatrix &vectors = {});
 template <>
-ErrorCode EigenGeneral(ConstRealMatrix a, ComplexVector values, ComplexMatrix vectors);
+ErrorCode EigenGeneral(const ConstRealMatrix &a, ComplexVector values,
+                       const ComplexMatrix &vectors);
 template <>
-ErrorCode EigenGeneral(ConstComplexMatrix a, ComplexVector values, ComplexMatrix vectors);
+ErrorCode EigenGeneral(const ConstComplexMatrix &a, ComplexVector values,
+                       const ComplexMatrix &vectors);
 
 // The same of a Hermitian matrix, which is read from its lower triangle; the values ascend and have
 // no imaginary part.
-ErrorCode EigenHermitian(ConstComplexMatrix a, ComplexVector values, ComplexMatrix vectors);
+ErrorCode EigenHermitian(const ConstComplexMatrix &a, ComplexVector values,
+                         const ComplexMatrix &vectors);
 
 } // namespace qx
 

@@ -17,7 +17,7 @@ class OrderedPencil {
 public:
     explicit OrderedPencil(int32_t n) : n_(n) {}
 
-    ErrorCode compute(ConstMatrixView<E> a, ConstMatrixView<E> b, SchurOrder order,
+    ErrorCode compute(const ConstMatrixView<E> &a, const ConstMatrixView<E> &b, SchurOrder order,
                       ComplexVector alpha, VectorView<E> beta) {
         if (const ErrorCode failed =
                 memory_.take(Aligned(Sized(s_, n_, n_)), Aligned(Sized(t_, n_, n_)),
@@ -32,7 +32,8 @@ public:
         return order == schurUnordered ? 0 : sort(order, alpha, beta);
     }
 
-    void write(MatrixView<E> s, MatrixView<E> t, MatrixView<E> q, MatrixView<E> z) const {
+    void write(const MatrixView<E> &s, const MatrixView<E> &t, const MatrixView<E> &q,
+               const MatrixView<E> &z) const {
         CopyTransposed<E>(s_, s);
         CopyTransposed<E>(t_, t);
         if (!q.isEmpty())
@@ -42,7 +43,7 @@ public:
     }
 
     // Right eigenvectors of unit length, in columns. The Schur vectors z are lost.
-    ErrorCode writeVectors(ConstComplexVector alpha, ComplexMatrix vectors) {
+    ErrorCode writeVectors(ConstComplexVector alpha, const ComplexMatrix &vectors) {
         const int32_t info = lapack::GeneralisedVectors(n_, s_.data(), t_.data(), z_.data());
         // A form of numbers that overflowed: NaN on the diagonal of t is no real number to LAPACK.
         if (info < 0)
@@ -62,7 +63,7 @@ public:
 
 private:
     // Column j, plus i times `sign` times the next one.
-    void writeVector(int32_t j, double sign, ComplexMatrix vector) const {
+    void writeVector(int32_t j, double sign, const ComplexMatrix &vector) const {
         const T *const re = z_.row(j);
         double squares = 0.0;
         const auto element = [&](int32_t i) {
@@ -134,9 +135,9 @@ private:
 } // namespace
 
 template <ElementType E>
-ErrorCode GeneralisedSchur(MatrixView<E> a, MatrixView<E> b, SchurOrder order, MatrixView<E> q,
-                           MatrixView<E> z, ComplexVector alpha, VectorView<E> beta,
-                           ComplexMatrix vectors) {
+ErrorCode GeneralisedSchur(const MatrixView<E> &a, const MatrixView<E> &b, SchurOrder order,
+                           const MatrixView<E> &q, const MatrixView<E> &z, ComplexVector alpha,
+                           VectorView<E> beta, const ComplexMatrix &vectors) {
     QX_EXPECTS(a.isSquare() && !a.isEmpty() && b.rows() == a.rows() && b.isSquare());
     if (!AllFinite<E>(a) || !AllFinite<E>(b))
         return ErrNonFiniteInput;
@@ -148,9 +149,10 @@ ErrorCode GeneralisedSchur(MatrixView<E> a, MatrixView<E> b, SchurOrder order, M
 }
 
 template <ElementType E>
-ErrorCode GeneralisedSingular(MatrixView<E> a, MatrixView<E> b, GeneralisedRanks *ranks,
-                              RealVector alpha, RealVector beta, MatrixView<E> u, MatrixView<E> v,
-                              MatrixView<E> q) {
+ErrorCode GeneralisedSingular(const MatrixView<E> &a, const MatrixView<E> &b,
+                              GeneralisedRanks *ranks, RealVector alpha, RealVector beta,
+                              const MatrixView<E> &u, const MatrixView<E> &v,
+                              const MatrixView<E> &q) {
     const int32_t m = a.rows(), n = a.cols(), p = b.rows();
     QX_EXPECTS(!a.isEmpty() && !b.isEmpty() && b.cols() == n);
     if (!AllFinite<E>(a) || !AllFinite<E>(b))
@@ -180,13 +182,18 @@ ErrorCode GeneralisedSingular(MatrixView<E> a, MatrixView<E> b, GeneralisedRanks
     return 0;
 }
 
-template ErrorCode GeneralisedSchur(RealMatrix, RealMatrix, SchurOrder, RealMatrix, RealMatrix,
-                                    ComplexVector, RealVector, ComplexMatrix);
-template ErrorCode GeneralisedSchur(ComplexMatrix, ComplexMatrix, SchurOrder, ComplexMatrix,
-                                    ComplexMatrix, ComplexVector, ComplexVector, ComplexMatrix);
-template ErrorCode GeneralisedSingular(RealMatrix, RealMatrix, GeneralisedRanks *, RealVector,
-                                       RealVector, RealMatrix, RealMatrix, RealMatrix);
-template ErrorCode GeneralisedSingular(ComplexMatrix, ComplexMatrix, GeneralisedRanks *, RealVector,
-                                       RealVector, ComplexMatrix, ComplexMatrix, ComplexMatrix);
+template ErrorCode GeneralisedSchur(const RealMatrix &, const RealMatrix &, SchurOrder,
+                                    const RealMatrix &, const RealMatrix &, ComplexVector,
+                                    RealVector, const ComplexMatrix &);
+template ErrorCode GeneralisedSchur(const ComplexMatrix &, const ComplexMatrix &, SchurOrder,
+                                    const ComplexMatrix &, const ComplexMatrix &, ComplexVector,
+                                    ComplexVector, const ComplexMatrix &);
+template ErrorCode GeneralisedSingular(const RealMatrix &, const RealMatrix &, GeneralisedRanks *,
+                                       RealVector, RealVector, const RealMatrix &,
+                                       const RealMatrix &, const RealMatrix &);
+template ErrorCode GeneralisedSingular(const ComplexMatrix &, const ComplexMatrix &,
+                                       GeneralisedRanks *, RealVector, RealVector,
+                                       const ComplexMatrix &, const ComplexMatrix &,
+                                       const ComplexMatrix &);
 
 } // namespace qx

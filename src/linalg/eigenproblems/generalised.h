@@ -14,18 +14,19 @@ namespace qx {
 //
 // ErrNonFiniteInput, ErrOutOfMemory, ErrIterationLimit, ErrConditionTooHigh, ErrSolverCount.
 template <ElementType E>
-ErrorCode GeneralisedSchur(MatrixView<E> a, MatrixView<E> b, SchurOrder order, MatrixView<E> q,
-                           MatrixView<E> z, ComplexVector alpha, VectorView<E> beta,
-                           ComplexMatrix vectors);
+ErrorCode GeneralisedSchur(const MatrixView<E> &a, const MatrixView<E> &b, SchurOrder order,
+                           const MatrixView<E> &q, const MatrixView<E> &z, ComplexVector alpha,
+                           VectorView<E> beta, const ComplexMatrix &vectors);
 
 // Generalised singular values of a (m by n) and b (p by n): u^H a q and v^H b q are diagonal
 // matrices of alpha and of beta times the same triangle (0 r). a and b become LAPACK's results, in
 // which r stands. alpha and beta have n elements, of which the first k + l count.
 // ErrNonFiniteInput, ErrOutOfMemory, ErrIterationLimit.
 template <ElementType E>
-ErrorCode GeneralisedSingular(MatrixView<E> a, MatrixView<E> b, GeneralisedRanks *ranks,
-                              RealVector alpha, RealVector beta, MatrixView<E> u, MatrixView<E> v,
-                              MatrixView<E> q);
+ErrorCode GeneralisedSingular(const MatrixView<E> &a, const MatrixView<E> &b,
+                              GeneralisedRanks *ranks, RealVector alpha, RealVector beta,
+                              const MatrixView<E> &u, const MatrixView<E> &v,
+                              const MatrixView<E> &q);
 
 } // namespace qx
 

@@ -12,7 +12,7 @@ namespace {
 // Reflections of the rows of the transposed Schur vectors, collected and applied many at a time.
 class ReflectionQueue {
 public:
-    explicit ReflectionQueue(RealMatrix a) : a_(a) {}
+    explicit ReflectionQueue(const RealMatrix &a) : a_(a) {}
     void add(const SmallReflection &reflection) {
         if (a_.isEmpty())
             return;
@@ -43,8 +43,8 @@ private:
 // matrix becomes quasi-triangular, without them only the part that the eigenvalues need is kept up.
 class RealQR {
 public:
-    RealQR(RealMatrix h, Balanced range, double negligible, ComplexVector values,
-           RealMatrix transposed)
+    RealQR(const RealMatrix &h, Balanced range, double negligible, ComplexVector values,
+           const RealMatrix &transposed)
         : h_(h), n_(h.rows()), range_(range), negligible_(negligible), values_(values),
           wantsVectors_(!transposed.isEmpty()), norm_(SumOfHessenberg(h)), vectors_(transposed) {}
 
@@ -233,7 +233,7 @@ private:
 
 } // namespace
 
-double SumOfHessenberg(ConstRealMatrix h) {
+double SumOfHessenberg(const ConstRealMatrix &h) {
     double sum = 0.0;
     for (int32_t i = 0; i < h.rows(); ++i)
         for (int32_t j = std::max(i - 1, 0); j < h.cols(); ++j)
@@ -241,8 +241,8 @@ double SumOfHessenberg(ConstRealMatrix h) {
     return sum;
 }
 
-ErrorCode RealSchurIteration(RealMatrix h, Balanced range, double negligible, ComplexVector values,
-                             RealMatrix transposed) {
+ErrorCode RealSchurIteration(const RealMatrix &h, Balanced range, double negligible,
+                             ComplexVector values, const RealMatrix &transposed) {
     return RealQR(h, range, negligible, values, transposed).run();
 }
 

@@ -7,7 +7,7 @@
 namespace qx {
 
 // The sum of the absolute values of a Hessenberg matrix.
-double SumOfHessenberg(ConstRealMatrix h);
+double SumOfHessenberg(const ConstRealMatrix &h);
 
 // The double-shift QR iteration on a real Hessenberg matrix h, in the block `range`. With
 // `transposed`, which holds the transposed basis, h becomes the quasi-triangular Schur form and
@@ -15,8 +15,8 @@ double SumOfHessenberg(ConstRealMatrix h);
 // two where a value has a positive imaginary part, and what it holds elsewhere below its diagonal
 // means nothing. An element beside the diagonal counts as 0 where it is within eps of its
 // neighbours or at most `negligible`. ErrIterationLimit.
-ErrorCode RealSchurIteration(RealMatrix h, Balanced range, double negligible, ComplexVector values,
-                             RealMatrix transposed);
+ErrorCode RealSchurIteration(const RealMatrix &h, Balanced range, double negligible,
+                             ComplexVector values, const RealMatrix &transposed);
 
 } // namespace qx
 

@@ -78,7 +78,7 @@ class SymmetricProblem {
     typedef Reflector<E> Reflection;
 
 public:
-    ErrorCode solve(ConstMatrixView<E> a, RealVector values, MatrixView<E> vectors) {
+    ErrorCode solve(const ConstMatrixView<E> &a, RealVector values, const MatrixView<E> &vectors) {
         const bool withVectors = !vectors.isEmpty();
         IndexVector order;
         n_ = a.rows();
@@ -187,14 +187,15 @@ private:
 } // namespace
 
 template <ElementType E>
-ErrorCode SymmetricEigen(ConstMatrixView<E> a, RealVector values, MatrixView<E> vectors) {
+ErrorCode SymmetricEigen(const ConstMatrixView<E> &a, RealVector values,
+                         const MatrixView<E> &vectors) {
     QX_EXPECTS(a.isSquare() && !a.isEmpty() && values.size() == a.rows());
     if (!AllFinite<E>(a))
         return ErrNonFiniteInput;
     return SymmetricProblem<E>().solve(a, values, vectors);
 }
 
-template ErrorCode SymmetricEigen(ConstRealMatrix, RealVector, RealMatrix);
-template ErrorCode SymmetricEigen(ConstComplexMatrix, RealVector, ComplexMatrix);
+template ErrorCode SymmetricEigen(const ConstRealMatrix &, RealVector, const RealMatrix &);
+template ErrorCode SymmetricEigen(const ConstComplexMatrix &, RealVector, const ComplexMatrix &);
 
 } // namespace qx

@@ -14,7 +14,8 @@ namespace qx {
 //
 // ErrNonFiniteInput, ErrOutOfMemory, ErrIterationLimit.
 template <ElementType E>
-ErrorCode SymmetricEigen(ConstMatrixView<E> a, RealVector values, MatrixView<E> vectors);
+ErrorCode SymmetricEigen(const ConstMatrixView<E> &a, RealVector values,
+                         const MatrixView<E> &vectors);
 
 } // namespace qx
 

@@ -32,7 +32,8 @@ private:
 // matrix of zeros the exponent is 0.
 template <ElementType E>
 struct Given {
-    Given(ConstMatrixView<E> matrix, bool isNegated) : elements(matrix), negated(isNegated) {}
+    Given(const ConstMatrixView<E> &matrix, bool isNegated)
+        : elements(matrix), negated(isNegated) {}
 
     // ErrNonFiniteInput.
     ErrorCode findExponent() {
@@ -51,7 +52,7 @@ struct Given {
         return 0;
     }
     // The scaled matrix times 2^further.
-    void copyTo(MatrixView<E> to, int further = 0) const {
+    void copyTo(const MatrixView<E> &to, int further = 0) const {
         const PowerOfTwo scale(further - exponent);
         for (int32_t i = 0; i < elements.rows(); ++i)
             for (int32_t j = 0; j < elements.cols(); ++j) {
@@ -67,7 +68,7 @@ struct Given {
 };
 
 template <ElementType E>
-double FrobeniusNorm(ConstMatrixView<E> a) {
+double FrobeniusNorm(const ConstMatrixView<E> &a) {
     double squares = 0.0;
     for (int32_t i = 0; i < a.rows(); ++i)
         for (int32_t j = 0; j < a.cols(); ++j)
@@ -76,7 +77,7 @@ double FrobeniusNorm(ConstMatrixView<E> a) {
 }
 
 template <ElementType E>
-void AdjointInPlace(MatrixView<E> a) {
+void AdjointInPlace(const MatrixView<E> &a) {
     for (int32_t i = 0; i < a.rows(); ++i)
         for (int32_t j = 0; j <= i; ++j) {
             const auto held = Conj(a(i, j));
@@ -107,7 +108,7 @@ public:
         : a_(a), b_(b), c_(c), m_(a.elements.rows()), n_(b.elements.rows()), products_(products),
           lyapunov_(lyapunov) {}
 
-    ErrorCode solve(MatrixView<E> x) {
+    ErrorCode solve(const MatrixView<E> &x) {
         for (Given<E> *given : {&a_, &b_, &c_})
             if (const ErrorCode bad = given->findExponent())
                 return bad;
@@ -194,7 +195,7 @@ private:
 
     // The right side c becomes the solution, divided by the power of two whose exponent is
     // returned.
-    int solveFactored(MatrixView<E> c) const {
+    int solveFactored(const MatrixView<E> &c) const {
         const ConstMatrixView<E> zA = sFactors_.adjoint(), zB = tFactors_.adjoint();
         OrderedProduct<E>(zA, c, work_);
         CopyAdjoint<E>(zB, square(n_));
@@ -250,7 +251,7 @@ private:
             }
     }
 
-    ErrorCode writeTo(MatrixView<E> x) const {
+    ErrorCode writeTo(const MatrixView<E> &x) const {
         const PowerOfTwo scale(c_.exponent - equationExponent_ + growth_);
         bool isFinite = true;
         for (int32_t i = 0; i < m_; ++i)
@@ -277,8 +278,9 @@ private:
 } // namespace
 
 template <ElementType E>
-ErrorCode SolveSylvester(ConstMatrixView<E> a, ConstMatrixView<E> b, ConstMatrixView<E> c,
-                         SylvesterEquation equation, MatrixView<E> x) {
+ErrorCode SolveSylvester(const ConstMatrixView<E> &a, const ConstMatrixView<E> &b,
+                         const ConstMatrixView<E> &c, SylvesterEquation equation,
+                         const MatrixView<E> &x) {
     QX_EXPECTS(a.isSquare() && b.isSquare() && c.rows() == a.rows() && c.cols() == b.rows());
     QX_EXPECTS(!c.isEmpty() && x.rows() == c.rows() && x.cols() == c.cols());
     return EquationSolver<E>({a, false}, {b, equation == sylvesterDifference}, {c, false},
@@ -287,20 +289,22 @@ ErrorCode SolveSylvester(ConstMatrixView<E> a, ConstMatrixView<E> b, ConstMatrix
 }
 
 template <ElementType E>
-ErrorCode SolveLyapunov(ConstMatrixView<E> a, ConstMatrixView<E> q, LyapunovEquation equation,
-                        MatrixView<E> x) {
+ErrorCode SolveLyapunov(const ConstMatrixView<E> &a, const ConstMatrixView<E> &q,
+                        LyapunovEquation equation, const MatrixView<E> &x) {
     QX_EXPECTS(a.isSquare() && !a.isEmpty() && q.isSquare() && q.rows() == a.rows());
     QX_EXPECTS(x.isSquare() && x.rows() == a.rows());
     const bool isDiscrete = equation == lyapunovDiscrete;
     return EquationSolver<E>({a, false}, {a, false}, {q, isDiscrete}, isDiscrete, true).solve(x);
 }
 
-template ErrorCode SolveSylvester(ConstRealMatrix, ConstRealMatrix, ConstRealMatrix,
-                                  SylvesterEquation, RealMatrix);
-template ErrorCode SolveSylvester(ConstComplexMatrix, ConstComplexMatrix, ConstComplexMatrix,
-                                  SylvesterEquation, ComplexMatrix);
-template ErrorCode SolveLyapunov(ConstRealMatrix, ConstRealMatrix, LyapunovEquation, RealMatrix);
-template ErrorCode SolveLyapunov(ConstComplexMatrix, ConstComplexMatrix, LyapunovEquation,
-                                 ComplexMatrix);
+template ErrorCode SolveSylvester(const ConstRealMatrix &, const ConstRealMatrix &,
+                                  const ConstRealMatrix &, SylvesterEquation, const RealMatrix &);
+template ErrorCode SolveSylvester(const ConstComplexMatrix &, const ConstComplexMatrix &,
+                                  const ConstComplexMatrix &, SylvesterEquation,
+                                  const ComplexMatrix &);
+template ErrorCode SolveLyapunov(const ConstRealMatrix &, const ConstRealMatrix &, LyapunovEquation,
+                                 const RealMatrix &);
+template ErrorCode SolveLyapunov(const ConstComplexMatrix &, const ConstComplexMatrix &,
+                                 LyapunovEquation, const ComplexMatrix &);
 
 } // namespace qx

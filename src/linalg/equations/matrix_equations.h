@@ -23,13 +23,14 @@ enum LyapunovEquation : int32_t {
 //
 // ErrNonFiniteInput, ErrIterationLimit, ErrSingularMatrix, ErrOverflow, ErrOutOfMemory.
 template <ElementType E>
-ErrorCode SolveSylvester(ConstMatrixView<E> a, ConstMatrixView<E> b, ConstMatrixView<E> c,
-                         SylvesterEquation equation, MatrixView<E> x);
+ErrorCode SolveSylvester(const ConstMatrixView<E> &a, const ConstMatrixView<E> &b,
+                         const ConstMatrixView<E> &c, SylvesterEquation equation,
+                         const MatrixView<E> &x);
 
 // All of one order; x is Hermitian to the bit where q is.
 template <ElementType E>
-ErrorCode SolveLyapunov(ConstMatrixView<E> a, ConstMatrixView<E> q, LyapunovEquation equation,
-                        MatrixView<E> x);
+ErrorCode SolveLyapunov(const ConstMatrixView<E> &a, const ConstMatrixView<E> &q,
+                        LyapunovEquation equation, const MatrixView<E> &x);
 
 } // namespace qx
 

@@ -9,7 +9,7 @@ namespace qx {
 namespace {
 
 template <ElementType E>
-void ConjugateInPlace(MatrixView<E> a) {
+void ConjugateInPlace(const MatrixView<E> &a) {
     for (int32_t i = 0; E == ElementType::CDB && i < a.rows(); ++i)
         for (int32_t j = 0; j < a.cols(); ++j)
             a(i, j) = Conj(a(i, j));
@@ -18,7 +18,7 @@ void ConjugateInPlace(MatrixView<E> a) {
 } // namespace
 
 template <ElementType E>
-void CopyAdjoint(ConstMatrixView<E> from, MatrixView<E> to) {
+void CopyAdjoint(const ConstMatrixView<E> &from, const MatrixView<E> &to) {
     CopyTransposed<E>(from, to);
     ConjugateInPlace<E>(to);
 }
@@ -80,8 +80,8 @@ void SchurFactors<E>::setAdjoint(const SchurFactors &a) {
     }
 }
 
-template void CopyAdjoint(ConstRealMatrix, RealMatrix);
-template void CopyAdjoint(ConstComplexMatrix, ComplexMatrix);
+template void CopyAdjoint(const ConstRealMatrix &, const RealMatrix &);
+template void CopyAdjoint(const ConstComplexMatrix &, const ComplexMatrix &);
 template class SchurFactors<ElementType::DBL>;
 template class SchurFactors<ElementType::CDB>;
 

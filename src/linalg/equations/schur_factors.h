@@ -36,7 +36,7 @@ private:
 
 // to = from^H.
 template <ElementType E>
-void CopyAdjoint(ConstMatrixView<E> from, MatrixView<E> to);
+void CopyAdjoint(const ConstMatrixView<E> &from, const MatrixView<E> &to);
 
 } // namespace qx
 

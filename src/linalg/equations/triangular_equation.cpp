@@ -64,7 +64,8 @@ class Substitution {
     typedef typename ScalarOf<E>::type Value;
 
 public:
-    Substitution(const TriangularEquation<E> &equation, MatrixView<E> f, MatrixView<E> work)
+    Substitution(const TriangularEquation<E> &equation, const MatrixView<E> &f,
+                 const MatrixView<E> &work)
         : equation_(equation), f_(f), work_(work) {}
 
     int run() {
@@ -79,19 +80,19 @@ private:
     };
 
     template <bool Writable>
-    static BasicMatrixView<E, Writable> part(BasicMatrixView<E, Writable> whole, Range rows,
+    static BasicMatrixView<E, Writable> part(const BasicMatrixView<E, Writable> &whole, Range rows,
                                              Range cols) {
         return whole.block(rows.from, cols.from, rows.size(), cols.size());
     }
 
     // Whether rows i - 1 and i of s or t belong to one block.
-    static bool isInPair(ConstMatrixView<E> triangle, int32_t i) {
+    static bool isInPair(const ConstMatrixView<E> &triangle, int32_t i) {
         return E == ElementType::DBL && AbsSum(triangle(i, i - 1)) != 0.0;
     }
-    static bool isCell(ConstMatrixView<E> triangle, Range range) {
+    static bool isCell(const ConstMatrixView<E> &triangle, Range range) {
         return range.size() == 1 || (range.size() == 2 && isInPair(triangle, range.from + 1));
     }
-    static int32_t middle(ConstMatrixView<E> triangle, Range range) {
+    static int32_t middle(const ConstMatrixView<E> &triangle, Range range) {
         const int32_t i = range.from + range.size() / 2;
         return isInPair(triangle, i) ? i + 1 : i;
     }
@@ -125,8 +126,8 @@ private:
     }
 
     // Takes from f what the solved part y adds to it: s y t, or of a sum y t or s y alone.
-    void subtractSolved(ConstMatrixView<E> s, ConstMatrixView<E> y, ConstMatrixView<E> t,
-                        MatrixView<E> f, bool throughT) {
+    void subtractSolved(const ConstMatrixView<E> &s, const ConstMatrixView<E> &y,
+                        const ConstMatrixView<E> &t, const MatrixView<E> &f, bool throughT) {
         if (equation_.products) {
             const MatrixView<E> yt(work_.data(), y.rows(), t.cols(), work_.stride());
             OrderedProduct<E>(y, t, yt);
@@ -195,15 +196,15 @@ private:
 } // namespace
 
 template <ElementType E>
-int SolveTriangularEquation(const TriangularEquation<E> &equation, MatrixView<E> f,
-                            MatrixView<E> work) {
+int SolveTriangularEquation(const TriangularEquation<E> &equation, const MatrixView<E> &f,
+                            const MatrixView<E> &work) {
     QX_EXPECTS(f.rows() == equation.s.rows() && f.cols() == equation.t.rows());
     return Substitution<E>(equation, f, work).run();
 }
 
-template int SolveTriangularEquation(const TriangularEquation<ElementType::DBL> &, RealMatrix,
-                                     RealMatrix);
-template int SolveTriangularEquation(const TriangularEquation<ElementType::CDB> &, ComplexMatrix,
-                                     ComplexMatrix);
+template int SolveTriangularEquation(const TriangularEquation<ElementType::DBL> &,
+                                     const RealMatrix &, const RealMatrix &);
+template int SolveTriangularEquation(const TriangularEquation<ElementType::CDB> &,
+                                     const ComplexMatrix &, const ComplexMatrix &);
 
 } // namespace qx

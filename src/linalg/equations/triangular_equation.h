@@ -23,8 +23,8 @@ struct TriangularEquation {
 // matrix equation AX + XB = C", 1972; the halving after I. Jonsson and B. Kagstrom, "Recursive
 // blocked algorithms for solving triangular systems", 2002). `work` is as large as f.
 template <ElementType E>
-int SolveTriangularEquation(const TriangularEquation<E> &equation, MatrixView<E> f,
-                            MatrixView<E> work);
+int SolveTriangularEquation(const TriangularEquation<E> &equation, const MatrixView<E> &f,
+                            const MatrixView<E> &work);
 
 } // namespace qx
 

@@ -60,7 +60,7 @@ Outcome InverseFromFactor(InOut<Vector> packed) {
 }
 
 template <ElementType E>
-ErrorCode InvertPositiveDefinite(MatrixView<E> a, VectorView<E> packed) {
+ErrorCode InvertPositiveDefinite(const MatrixView<E> &a, VectorView<E> packed) {
     PackMatrix<E>(a, symmetric, packed);
     if (const ErrorCode failed = PackedCholesky<E>(packed, a.rows()))
         return failed;
@@ -136,7 +136,7 @@ Outcome QRByAlgorithm(In<Matrix> a, int32_t algorithm, Out<Matrix> q, Out<Matrix
 }
 
 // permutation[pivots[j]][j] = 1
-void WritePermutation(ConstIndexVector pivots, MatrixView<ElementType::I32> permutation) {
+void WritePermutation(ConstIndexVector pivots, const MatrixView<ElementType::I32> &permutation) {
     for (int32_t i = 0; i < permutation.rows(); ++i)
         for (int32_t j = 0; j < permutation.cols(); ++j)
             permutation(i, j) = pivots[j] == i;

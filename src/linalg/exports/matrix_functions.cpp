@@ -13,7 +13,7 @@ ErrorCode CheckShapeFirst(const Block<Matrix> &a) {
     return FirstFailed({{!a.isSquare(), ErrNotSquare}, {a.isEmpty(), ErrEmptyInput}});
 }
 
-void CopyAsComplex(ConstRealMatrix from, ComplexMatrix to) {
+void CopyAsComplex(const ConstRealMatrix &from, const ComplexMatrix &to) {
     for (int32_t i = 0; i < from.rows(); ++i)
         for (int32_t j = 0; j < from.cols(); ++j)
             to(i, j) = {from(i, j), 0.0};

@@ -10,7 +10,7 @@ class Balancing {
     typedef ElementOf<E> T;
 
 public:
-    Balancing(MatrixView<E> a, RealVector scale)
+    Balancing(const MatrixView<E> &a, RealVector scale)
         : a_(a), n_(a.rows()), high_(n_ - 1), scale_(scale) {}
 
     void permute() {
@@ -128,7 +128,7 @@ private:
 } // namespace
 
 template <ElementType E>
-Balanced Balance(MatrixView<E> a, bool permute, bool scaleToo, RealVector scale) {
+Balanced Balance(const MatrixView<E> &a, bool permute, bool scaleToo, RealVector scale) {
     QX_EXPECTS(a.isSquare() && scale.size() == a.rows());
     Balancing<E> balancing(a, scale);
     if (permute)
@@ -144,7 +144,8 @@ Balanced Balance(MatrixView<E> a, bool permute, bool scaleToo, RealVector scale)
 }
 
 template <ElementType E>
-void UndoScaling(ConstRealVector scale, Balanced range, EigenvectorSide side, MatrixView<E> v) {
+void UndoScaling(ConstRealVector scale, Balanced range, EigenvectorSide side,
+                 const MatrixView<E> &v) {
     if (range.low == range.high)
         return;
     for (int32_t i = range.low; i <= range.high; ++i) {
@@ -155,7 +156,7 @@ void UndoScaling(ConstRealVector scale, Balanced range, EigenvectorSide side, Ma
 }
 
 template <ElementType E>
-void UndoPermutation(ConstRealVector scale, Balanced range, MatrixView<E> v) {
+void UndoPermutation(ConstRealVector scale, Balanced range, const MatrixView<E> &v) {
     const auto exchange = [=](int32_t i) {
         const auto other = static_cast<int32_t>(scale[i]);
         for (int32_t j = 0; other != i && j < v.cols(); ++j)
@@ -167,11 +168,11 @@ void UndoPermutation(ConstRealVector scale, Balanced range, MatrixView<E> v) {
         exchange(i);
 }
 
-template Balanced Balance(RealMatrix, bool, bool, RealVector);
-template Balanced Balance(ComplexMatrix, bool, bool, RealVector);
-template void UndoScaling(ConstRealVector, Balanced, EigenvectorSide, RealMatrix);
-template void UndoScaling(ConstRealVector, Balanced, EigenvectorSide, ComplexMatrix);
-template void UndoPermutation(ConstRealVector, Balanced, RealMatrix);
-template void UndoPermutation(ConstRealVector, Balanced, ComplexMatrix);
+template Balanced Balance(const RealMatrix &, bool, bool, RealVector);
+template Balanced Balance(const ComplexMatrix &, bool, bool, RealVector);
+template void UndoScaling(ConstRealVector, Balanced, EigenvectorSide, const RealMatrix &);
+template void UndoScaling(ConstRealVector, Balanced, EigenvectorSide, const ComplexMatrix &);
+template void UndoPermutation(ConstRealVector, Balanced, const RealMatrix &);
+template void UndoPermutation(ConstRealVector, Balanced, const ComplexMatrix &);
 
 } // namespace qx

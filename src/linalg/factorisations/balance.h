@@ -16,15 +16,16 @@ struct Balanced {
     int32_t low, high;
 };
 template <ElementType E>
-Balanced Balance(MatrixView<E> a, bool permute, bool scaleToo, RealVector scale);
+Balanced Balance(const MatrixView<E> &a, bool permute, bool scaleToo, RealVector scale);
 
 // Eigenvectors of the balanced matrix, in the columns of v, become those of the original one:
 // factors, then exchanges. Left eigenvectors take the inverse factors.
 enum class EigenvectorSide { Right, Left };
 template <ElementType E>
-void UndoScaling(ConstRealVector scale, Balanced range, EigenvectorSide side, MatrixView<E> v);
+void UndoScaling(ConstRealVector scale, Balanced range, EigenvectorSide side,
+                 const MatrixView<E> &v);
 template <ElementType E>
-void UndoPermutation(ConstRealVector scale, Balanced range, MatrixView<E> v);
+void UndoPermutation(ConstRealVector scale, Balanced range, const MatrixView<E> &v);
 
 } // namespace qx
 

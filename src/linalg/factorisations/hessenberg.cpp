@@ -5,7 +5,8 @@
 namespace qx {
 
 template <ElementType E>
-ErrorCode ReduceToHessenberg(MatrixView<E> a, int32_t low, int32_t high, MatrixView<E> q) {
+ErrorCode ReduceToHessenberg(const MatrixView<E> &a, int32_t low, int32_t high,
+                             const MatrixView<E> &q) {
     typedef ElementOf<E> T;
     typedef Reflector<E> Reflection;
     const int32_t n = a.rows();
@@ -45,7 +46,8 @@ ErrorCode ReduceToHessenberg(MatrixView<E> a, int32_t low, int32_t high, MatrixV
     return 0;
 }
 
-template ErrorCode ReduceToHessenberg(RealMatrix, int32_t, int32_t, RealMatrix);
-template ErrorCode ReduceToHessenberg(ComplexMatrix, int32_t, int32_t, ComplexMatrix);
+template ErrorCode ReduceToHessenberg(const RealMatrix &, int32_t, int32_t, const RealMatrix &);
+template ErrorCode ReduceToHessenberg(const ComplexMatrix &, int32_t, int32_t,
+                                      const ComplexMatrix &);
 
 } // namespace qx

@@ -8,7 +8,8 @@ namespace qx {
 // Reduces rows and columns low to high (from 0) of a square a to upper Hessenberg form h = q^H a q
 // by Householder reflections. a becomes h; q, of the same order, may be empty. ErrOutOfMemory.
 template <ElementType E>
-ErrorCode ReduceToHessenberg(MatrixView<E> a, int32_t low, int32_t high, MatrixView<E> q);
+ErrorCode ReduceToHessenberg(const MatrixView<E> &a, int32_t low, int32_t high,
+                             const MatrixView<E> &q);
 
 } // namespace qx
 

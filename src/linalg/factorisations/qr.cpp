@@ -29,7 +29,7 @@ class HouseholderQR {
 public:
     HouseholderQR(int32_t m, int32_t n) : m_(m), n_(n), count_(std::min(m, n)) {}
 
-    ErrorCode take(ConstMatrixView<E> a) {
+    ErrorCode take(const ConstMatrixView<E> &a) {
         if (const ErrorCode failed = memory_.take(
                 SizedPadded(matrix_, m_, n_), Sized(kappa_, count_), Sized(first_, count_),
                 Sized(column_, m_), Sized(work_, int64_t{m_} + std::max(m_, n_))))
@@ -71,13 +71,13 @@ public:
         return 0;
     }
 
-    void writeR(MatrixView<E> r) const {
+    void writeR(const MatrixView<E> &r) const {
         for (int32_t i = 0; i < r.rows(); ++i)
             for (int32_t j = 0; j < n_; ++j)
                 r(i, j) = j < i ? T{} : at(i)[j];
     }
     // The first columns of H0^H H1^H ...
-    void writeQ(MatrixView<E> q) const {
+    void writeQ(const MatrixView<E> &q) const {
         SetIdentity<E>(q);
         for (int32_t k = count_ - 1; k >= 0; --k) {
             column_[0] = first_[k];
@@ -140,7 +140,7 @@ public:
     }
 
     // Column j of a into column j of r.
-    void addColumn(ConstMatrixView<E> a, int32_t j, MatrixView<E> r) {
+    void addColumn(const ConstMatrixView<E> &a, int32_t j, const MatrixView<E> &r) {
         double largest = 0.0;
         for (int32_t i = 0; i < m_; ++i)
             largest = std::max(largest, AbsSum(a(i, j)) * 0.5);
@@ -184,7 +184,7 @@ public:
         keep(j, Length<E>(vector_.data(), 1, m_));
     }
 
-    void writeQ(MatrixView<E> q) const {
+    void writeQ(const MatrixView<E> &q) const {
         for (int32_t i = 0; i < m_; ++i)
             for (int32_t j = 0; j < m_; ++j)
                 q(i, j) = Conj(conjugates_(j, i));
@@ -242,7 +242,8 @@ private:
 
 // Rows of r and columns of q.
 template <ElementType E>
-bool AreFactors(ConstMatrixView<E> a, QRForm form, ConstMatrixView<E> q, ConstMatrixView<E> r) {
+bool AreFactors(const ConstMatrixView<E> &a, QRForm form, const ConstMatrixView<E> &q,
+                const ConstMatrixView<E> &r) {
     const int32_t m = a.rows(), size = form == qrFull ? m : std::min(m, a.cols());
     return r.rows() == size && r.cols() == a.cols() &&
            (form == qrOnlyR || (q.rows() == m && q.cols() == size));
@@ -250,8 +251,8 @@ bool AreFactors(ConstMatrixView<E> a, QRForm form, ConstMatrixView<E> q, ConstMa
 
 // Pivots are empty where the columns stay in their order.
 template <ElementType E>
-ErrorCode Decompose(ConstMatrixView<E> a, QRForm form, IndexVector pivots, MatrixView<E> q,
-                    MatrixView<E> r) {
+ErrorCode Decompose(const ConstMatrixView<E> &a, QRForm form, IndexVector pivots,
+                    const MatrixView<E> &q, const MatrixView<E> &r) {
     QX_EXPECTS(!a.isEmpty() && AreFactors<E>(a, form, q, r));
     if (!AllFinite<E>(a))
         return ErrNonFiniteInput;
@@ -271,20 +272,21 @@ ErrorCode Decompose(ConstMatrixView<E> a, QRForm form, IndexVector pivots, Matri
 } // namespace
 
 template <ElementType E>
-ErrorCode QRDecompose(ConstMatrixView<E> a, QRForm form, MatrixView<E> q, MatrixView<E> r) {
+ErrorCode QRDecompose(const ConstMatrixView<E> &a, QRForm form, const MatrixView<E> &q,
+                      const MatrixView<E> &r) {
     return Decompose<E>(a, form, {}, q, r);
 }
 
 template <ElementType E>
-ErrorCode QRDecomposePivoted(ConstMatrixView<E> a, QRForm form, IndexVector pivots, MatrixView<E> q,
-                             MatrixView<E> r) {
+ErrorCode QRDecomposePivoted(const ConstMatrixView<E> &a, QRForm form, IndexVector pivots,
+                             const MatrixView<E> &q, const MatrixView<E> &r) {
     QX_EXPECTS(pivots.size() == a.cols());
     return Decompose<E>(a, form, pivots, q, r);
 }
 
 template <ElementType E>
-ErrorCode QRByGramSchmidt(ConstMatrixView<E> a, GramSchmidt order, MatrixView<E> q,
-                          MatrixView<E> r) {
+ErrorCode QRByGramSchmidt(const ConstMatrixView<E> &a, GramSchmidt order, const MatrixView<E> &q,
+                          const MatrixView<E> &r) {
     QX_EXPECTS(!a.isEmpty() && AreFactors<E>(a, qrFull, q, r));
     if (!AllFinite<E>(a))
         return ErrNonFiniteInput;
@@ -299,12 +301,17 @@ ErrorCode QRByGramSchmidt(ConstMatrixView<E> a, GramSchmidt order, MatrixView<E>
     return 0;
 }
 
-template ErrorCode QRDecompose(ConstRealMatrix, QRForm, RealMatrix, RealMatrix);
-template ErrorCode QRDecompose(ConstComplexMatrix, QRForm, ComplexMatrix, ComplexMatrix);
-template ErrorCode QRDecomposePivoted(ConstRealMatrix, QRForm, IndexVector, RealMatrix, RealMatrix);
-template ErrorCode QRDecomposePivoted(ConstComplexMatrix, QRForm, IndexVector, ComplexMatrix,
-                                      ComplexMatrix);
-template ErrorCode QRByGramSchmidt(ConstRealMatrix, GramSchmidt, RealMatrix, RealMatrix);
-template ErrorCode QRByGramSchmidt(ConstComplexMatrix, GramSchmidt, ComplexMatrix, ComplexMatrix);
+template ErrorCode QRDecompose(const ConstRealMatrix &, QRForm, const RealMatrix &,
+                               const RealMatrix &);
+template ErrorCode QRDecompose(const ConstComplexMatrix &, QRForm, const ComplexMatrix &,
+                               const ComplexMatrix &);
+template ErrorCode QRDecomposePivoted(const ConstRealMatrix &, QRForm, IndexVector,
+                                      const RealMatrix &, const RealMatrix &);
+template ErrorCode QRDecomposePivoted(const ConstComplexMatrix &, QRForm, IndexVector,
+                                      const ComplexMatrix &, const ComplexMatrix &);
+template ErrorCode QRByGramSchmidt(const ConstRealMatrix &, GramSchmidt, const RealMatrix &,
+                                   const RealMatrix &);
+template ErrorCode QRByGramSchmidt(const ConstComplexMatrix &, GramSchmidt, const ComplexMatrix &,
+                                   const ComplexMatrix &);
 
 } // namespace qx

@@ -13,14 +13,15 @@ enum QRForm : int32_t { qrFull = 0, qrEconomical = 1, qrOnlyR = 2 };
 // either sign. a stays as it is. q may be empty with qrOnlyR.
 // ErrNonFiniteInput, ErrOutOfMemory.
 template <ElementType E>
-ErrorCode QRDecompose(ConstMatrixView<E> a, QRForm form, MatrixView<E> q, MatrixView<E> r);
+ErrorCode QRDecompose(const ConstMatrixView<E> &a, QRForm form, const MatrixView<E> &q,
+                      const MatrixView<E> &r);
 
 // The same for the matrix whose column j is column pivots[j] of a. Each step takes the column that
 // is longest below the rows done (P. Businger and G. H. Golub, "Linear least squares solutions by
 // Householder transformations", 1965), so the diagonal of r falls in absolute value.
 template <ElementType E>
-ErrorCode QRDecomposePivoted(ConstMatrixView<E> a, QRForm form, IndexVector pivots, MatrixView<E> q,
-                             MatrixView<E> r);
+ErrorCode QRDecomposePivoted(const ConstMatrixView<E> &a, QRForm form, IndexVector pivots,
+                             const MatrixView<E> &q, const MatrixView<E> &r);
 
 // Full q and r by Gram-Schmidt orthogonalisation, each projection made twice: q is then unitary to
 // a small multiple of m eps also where the columns nearly depend on each other (L. Giraud, J.
@@ -30,8 +31,8 @@ ErrorCode QRDecomposePivoted(ConstMatrixView<E> a, QRForm form, IndexVector pivo
 // ErrNonFiniteInput, ErrOutOfMemory.
 enum class GramSchmidt { Modified, Classical };
 template <ElementType E>
-ErrorCode QRByGramSchmidt(ConstMatrixView<E> a, GramSchmidt order, MatrixView<E> q,
-                          MatrixView<E> r);
+ErrorCode QRByGramSchmidt(const ConstMatrixView<E> &a, GramSchmidt order, const MatrixView<E> &q,
+                          const MatrixView<E> &r);
 
 } // namespace qx
 

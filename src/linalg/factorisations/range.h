@@ -13,7 +13,7 @@ namespace qx {
 // overflow nor vanish, and returns the exponent that takes its values back. No digit changes.
 // Matrices of ordinary size are left alone; which are too small, the caller says.
 template <ElementType E>
-int BringIntoRange(MatrixView<E> a, double tooSmall) {
+int BringIntoRange(const MatrixView<E> &a, double tooSmall) {
     double largest = 0.0;
     for (int32_t i = 0; i < a.rows(); ++i)
         for (int32_t j = 0; j < a.cols(); ++j)

@@ -50,7 +50,7 @@ public:
 
 // a becomes H a: a - v (v^H a) / kappa. `work` has rows + cols elements at least.
 template <ElementType E>
-void ReflectFromLeft(MatrixView<E> a, ConstVectorView<E> v, typename ScalarOf<E>::type kappa,
+void ReflectFromLeft(const MatrixView<E> &a, ConstVectorView<E> v, typename ScalarOf<E>::type kappa,
                      VectorView<E> work) {
     const int32_t rows = a.rows(), cols = a.cols();
     if (AbsSum(kappa) == 0.0 || cols < 1)
@@ -68,8 +68,8 @@ void ReflectFromLeft(MatrixView<E> a, ConstVectorView<E> v, typename ScalarOf<E>
 
 // a becomes a H: a - (a v) v^H / kappa. `work` has rows + cols elements at least.
 template <ElementType E>
-void ReflectFromRight(MatrixView<E> a, ConstVectorView<E> v, typename ScalarOf<E>::type kappa,
-                      VectorView<E> work) {
+void ReflectFromRight(const MatrixView<E> &a, ConstVectorView<E> v,
+                      typename ScalarOf<E>::type kappa, VectorView<E> work) {
     const int32_t rows = a.rows(), cols = a.cols();
     if (AbsSum(kappa) == 0.0 || rows < 1)
         return;

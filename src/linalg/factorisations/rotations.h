@@ -11,7 +11,7 @@ namespace qx {
 class RotationQueue {
 public:
     RotationQueue() = default;
-    explicit RotationQueue(RealMatrix a) : a_(a) {}
+    explicit RotationQueue(const RealMatrix &a) : a_(a) {}
     RotationQueue(const RotationQueue &) = delete;
     RotationQueue &operator=(const RotationQueue &) = delete;
     ~RotationQueue() { flush(); }

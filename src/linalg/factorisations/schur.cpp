@@ -16,7 +16,8 @@ class OrderedSchur {
 public:
     explicit OrderedSchur(int32_t n) : n_(n) {}
 
-    ErrorCode compute(ConstMatrixView<E> a, SchurOrder order, bool withVectors, ComplexVector w) {
+    ErrorCode compute(const ConstMatrixView<E> &a, SchurOrder order, bool withVectors,
+                      ComplexVector w) {
         const int32_t vectorsOrder = withVectors ? n_ : 0;
         if (const ErrorCode failed =
                 memory_.take(Aligned(Sized(form_, n_, n_)),
@@ -40,7 +41,7 @@ public:
         readValues(w);
         return 0;
     }
-    void write(MatrixView<E> t, MatrixView<E> z) const {
+    void write(const MatrixView<E> &t, const MatrixView<E> &z) const {
         CopyTransposed<E>(form_, t);
         if (!z.isEmpty())
             CopyTransposed<E>(vectors_, z);
@@ -95,8 +96,8 @@ private:
 } // namespace
 
 template <ElementType E>
-ErrorCode SchurDecompose(ConstMatrixView<E> a, SchurOrder order, MatrixView<E> z, MatrixView<E> t,
-                         ComplexVector w) {
+ErrorCode SchurDecompose(const ConstMatrixView<E> &a, SchurOrder order, const MatrixView<E> &z,
+                         const MatrixView<E> &t, ComplexVector w) {
     QX_EXPECTS(a.isSquare() && !a.isEmpty() && w.size() == a.rows());
     if (!AllFinite<E>(a))
         return ErrNonFiniteInput;
@@ -107,9 +108,9 @@ ErrorCode SchurDecompose(ConstMatrixView<E> a, SchurOrder order, MatrixView<E> z
     return 0;
 }
 
-template ErrorCode SchurDecompose(ConstRealMatrix, SchurOrder, RealMatrix, RealMatrix,
-                                  ComplexVector);
-template ErrorCode SchurDecompose(ConstComplexMatrix, SchurOrder, ComplexMatrix, ComplexMatrix,
-                                  ComplexVector);
+template ErrorCode SchurDecompose(const ConstRealMatrix &, SchurOrder, const RealMatrix &,
+                                  const RealMatrix &, ComplexVector);
+template ErrorCode SchurDecompose(const ConstComplexMatrix &, SchurOrder, const ComplexMatrix &,
+                                  const ComplexMatrix &, ComplexVector);
 
 } // namespace qx

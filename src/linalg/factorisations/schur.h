@@ -20,8 +20,8 @@ enum SchurOrder : int32_t {
 //
 // ErrNonFiniteInput, ErrOutOfMemory, ErrIterationLimit, ErrConditionTooHigh.
 template <ElementType E>
-ErrorCode SchurDecompose(ConstMatrixView<E> a, SchurOrder order, MatrixView<E> z, MatrixView<E> t,
-                         ComplexVector w);
+ErrorCode SchurDecompose(const ConstMatrixView<E> &a, SchurOrder order, const MatrixView<E> &z,
+                         const MatrixView<E> &t, ComplexVector w);
 
 } // namespace qx
 

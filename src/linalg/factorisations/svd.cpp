@@ -37,8 +37,8 @@ public:
         return 0;
     }
 
-    void take(ConstMatrixView<E> a) { CopyMatrix<E>(a, matrix_); }
-    void takeWide(ConstMatrixView<E> a) {
+    void take(const ConstMatrixView<E> &a) { CopyMatrix<E>(a, matrix_); }
+    void takeWide(const ConstMatrixView<E> &a) {
         CopyTransposed<E>(a, matrix_);
         for (int32_t i = 0; i < m_; ++i)
             for (int32_t j = 0; j < n_; ++j)
@@ -59,7 +59,7 @@ public:
     }
 
     // u is m by n and v n by n, both without gaps.
-    ErrorCode vectors(MatrixView<E> u, RealVector s, MatrixView<E> v) {
+    ErrorCode vectors(const MatrixView<E> &u, RealVector s, const MatrixView<E> &v) {
         const int exponent = bringIntoRange();
         Scratch<ElementType::I32> order;
         if (const ErrorCode failed = order.allocate(n_))
@@ -150,7 +150,7 @@ private:
     }
 
     // v = P0 P1 ... where Pi is the reflection that row i holds from its element i + 1 on.
-    void accumulateRight(MatrixView<E> v) {
+    void accumulateRight(const MatrixView<E> &v) {
         for (int32_t i = n_ - 1; i >= 0; --i) {
             setUnit(v, i);
             if (i > 0)
@@ -158,7 +158,7 @@ private:
                                    Conj(rightKappa_[i - 1]), work_);
         }
     }
-    void accumulateLeft(MatrixView<E> u) {
+    void accumulateLeft(const MatrixView<E> &u) {
         for (int32_t i = n_ - 1; i >= 0; --i) {
             setUnit(u, i);
             for (int32_t k = i; k < m_; ++k)
@@ -168,7 +168,7 @@ private:
         }
     }
     // Row i, and column i from the diagonal on, become those of the unit matrix.
-    void setUnit(MatrixView<E> a, int32_t i) {
+    void setUnit(const MatrixView<E> &a, int32_t i) {
         for (int32_t j = 0; j < n_; ++j)
             a(i, j) = T{};
         for (int32_t k = i; k < a.rows(); ++k)
@@ -198,7 +198,7 @@ private:
 
 // Completes the orthonormal columns of `thin` to a unitary matrix.
 template <ElementType E>
-ErrorCode Complete(ConstMatrixView<E> thin, MatrixView<E> full) {
+ErrorCode Complete(const ConstMatrixView<E> &thin, const MatrixView<E> &full) {
     MatrixView<E> r;
     ScratchParts memory;
     if (const ErrorCode failed = memory.take(Sized(r, thin.rows(), thin.cols())))
@@ -213,7 +213,7 @@ ErrorCode Complete(ConstMatrixView<E> thin, MatrixView<E> full) {
 
 // Of a tall or square matrix. u may be larger than what the decomposition gives.
 template <ElementType E>
-ErrorCode Vectors(TallSVD<E> &svd, MatrixView<E> u, RealVector s, MatrixView<E> v) {
+ErrorCode Vectors(TallSVD<E> &svd, const MatrixView<E> &u, RealVector s, const MatrixView<E> &v) {
     if (u.cols() == v.cols())
         return svd.vectors(u, s, v);
     MatrixView<E> thin;
@@ -226,8 +226,8 @@ ErrorCode Vectors(TallSVD<E> &svd, MatrixView<E> u, RealVector s, MatrixView<E> 
 }
 
 template <ElementType E>
-bool AreFactors(ConstMatrixView<E> a, ConstMatrixView<E> u, ConstRealVector s,
-                ConstMatrixView<E> v) {
+bool AreFactors(const ConstMatrixView<E> &a, const ConstMatrixView<E> &u, ConstRealVector s,
+                const ConstMatrixView<E> &v) {
     const int32_t k = std::min(a.rows(), a.cols());
     const bool thin = u.cols() == k && v.cols() == k;
     return u.rows() == a.rows() && v.rows() == a.cols() && s.size() == k &&
@@ -237,7 +237,8 @@ bool AreFactors(ConstMatrixView<E> a, ConstMatrixView<E> u, ConstRealVector s,
 } // namespace
 
 template <ElementType E>
-ErrorCode SVDecompose(ConstMatrixView<E> a, MatrixView<E> u, RealVector s, MatrixView<E> v) {
+ErrorCode SVDecompose(const ConstMatrixView<E> &a, const MatrixView<E> &u, RealVector s,
+                      const MatrixView<E> &v) {
     const int32_t m = a.rows(), n = a.cols();
     QX_EXPECTS(!a.isEmpty() && AllFinite<E>(a) && AreFactors<E>(a, u, s, v));
     TallSVD<E> svd(std::max(m, n), std::min(m, n));
@@ -252,7 +253,7 @@ ErrorCode SVDecompose(ConstMatrixView<E> a, MatrixView<E> u, RealVector s, Matri
 }
 
 template <ElementType E>
-ErrorCode SingularValues(ConstMatrixView<E> a, RealVector s) {
+ErrorCode SingularValues(const ConstMatrixView<E> &a, RealVector s) {
     const int32_t m = a.rows(), n = a.cols();
     QX_EXPECTS(!a.isEmpty() && AllFinite<E>(a) && s.size() == std::min(m, n));
     TallSVD<E> svd(std::max(m, n), std::min(m, n));
@@ -265,9 +266,11 @@ ErrorCode SingularValues(ConstMatrixView<E> a, RealVector s) {
     return svd.values(s);
 }
 
-template ErrorCode SVDecompose(ConstRealMatrix, RealMatrix, RealVector, RealMatrix);
-template ErrorCode SVDecompose(ConstComplexMatrix, ComplexMatrix, RealVector, ComplexMatrix);
-template ErrorCode SingularValues(ConstRealMatrix, RealVector);
-template ErrorCode SingularValues(ConstComplexMatrix, RealVector);
+template ErrorCode SVDecompose(const ConstRealMatrix &, const RealMatrix &, RealVector,
+                               const RealMatrix &);
+template ErrorCode SVDecompose(const ConstComplexMatrix &, const ComplexMatrix &, RealVector,
+                               const ComplexMatrix &);
+template ErrorCode SingularValues(const ConstRealMatrix &, RealVector);
+template ErrorCode SingularValues(const ConstComplexMatrix &, RealVector);
 
 } // namespace qx

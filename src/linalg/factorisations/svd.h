@@ -15,11 +15,12 @@ namespace qx {
 //
 // ErrOutOfMemory, ErrIterationLimit.
 template <ElementType E>
-ErrorCode SVDecompose(ConstMatrixView<E> a, MatrixView<E> u, RealVector s, MatrixView<E> v);
+ErrorCode SVDecompose(const ConstMatrixView<E> &a, const MatrixView<E> &u, RealVector s,
+                      const MatrixView<E> &v);
 
 // The singular values alone, falling.
 template <ElementType E>
-ErrorCode SingularValues(ConstMatrixView<E> a, RealVector s);
+ErrorCode SingularValues(const ConstMatrixView<E> &a, RealVector s);
 
 } // namespace qx
 

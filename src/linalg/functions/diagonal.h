@@ -7,7 +7,7 @@ namespace qx {
 
 // Whether every element off the diagonal is exactly 0.
 template <ElementType E>
-bool IsDiagonal(ConstMatrixView<E> a) {
+bool IsDiagonal(const ConstMatrixView<E> &a) {
     for (int32_t i = 0; i < a.rows(); ++i)
         for (int32_t j = 0; j < a.cols(); ++j)
             if (i != j && AbsSum(a(i, j)) != 0.0)

@@ -19,7 +19,7 @@ int32_t Squarings(double norm) {
 template <ElementType E>
 class PadeExponential {
 public:
-    ErrorCode replace(MatrixView<E> a) {
+    ErrorCode replace(const MatrixView<E> &a) {
         const int32_t n = a.rows();
         if (const ErrorCode failed =
                 memory_.take(Sized(scaled_, n, n), Sized(denominator_, n, n), Sized(power_, n, n),
@@ -48,7 +48,7 @@ public:
 
 private:
     // The numerator and the denominator of the approximant of degree q at the scaled matrix.
-    ErrorCode sumUp(int32_t q, MatrixView<E> numerator) {
+    ErrorCode sumUp(int32_t q, const MatrixView<E> &numerator) {
         const int32_t n = numerator.rows();
         for (int32_t i = 0; i < n; ++i)
             for (int32_t j = 0; j < n; ++j) {
@@ -78,7 +78,7 @@ private:
     }
 
     // The scaled matrix becomes the quotient. A singular denominator is not looked for.
-    ErrorCode divide(ConstMatrixView<E> numerator) {
+    ErrorCode divide(const ConstMatrixView<E> &numerator) {
         int32_t parity;
         LUDecompose<E>(denominator_, pivots_, &parity);
         if (const ErrorCode failed = InvertFactors<E>(denominator_, pivots_))
@@ -116,7 +116,7 @@ int32_t PadeDegree(double tolerance, double norm) {
 }
 
 template <ElementType E>
-ErrorCode MatrixExponential(MatrixView<E> a) {
+ErrorCode MatrixExponential(const MatrixView<E> &a) {
     QX_EXPECTS(a.isSquare() && !a.isEmpty());
     if (!IsDiagonal<E>(a))
         return PadeExponential<E>().replace(a);
@@ -125,7 +125,7 @@ ErrorCode MatrixExponential(MatrixView<E> a) {
     return 0;
 }
 
-template ErrorCode MatrixExponential(RealMatrix);
-template ErrorCode MatrixExponential(ComplexMatrix);
+template ErrorCode MatrixExponential(const RealMatrix &);
+template ErrorCode MatrixExponential(const ComplexMatrix &);
 
 } // namespace qx

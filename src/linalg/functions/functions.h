@@ -12,7 +12,7 @@ namespace qx {
 // "Nineteen dubious ways to compute the exponential of a matrix", 1978). ErrNonFiniteInput, also
 // where the largest row sum overflows, but not for a diagonal matrix.
 template <ElementType E>
-ErrorCode MatrixExponential(MatrixView<E> a);
+ErrorCode MatrixExponential(const MatrixView<E> &a);
 
 // The smallest degree q, at least 1, with e(q) exp(e(q)) <= tolerance / (exp(norm) norm), where
 // e(q) = 2^(3 - 2q) q!^2 / ((2q)! (2q + 1)!) bounds the error of the approximant.
@@ -22,18 +22,18 @@ int32_t PadeDegree(double tolerance, double norm);
 // take the place of a. ErrNonFiniteInput, also where an eigenvalue overflows; the codes of the
 // Schur form; WarnLowAccuracy where two eigenvalues or more are below 1e-12, for which there may be
 // no root.
-ErrorCode MatrixSquareRoot(ConstComplexMatrix a, ComplexMatrix root);
+ErrorCode MatrixSquareRoot(const ConstComplexMatrix &a, const ComplexMatrix &root);
 
 // a becomes its principal logarithm: of the eigenvalues, where the eigenvectors' condition number
 // is up to 1e14, else by repeated square roots; then refined until exp gives a back to 1e-12.
 // ErrNonFiniteInput; ErrDegenerateValue (no logarithm was found); WarnSingular (a has a zero
 // eigenvalue, and repeated roots gave a result all the same); WarnLowAccuracy (1e-12 was not
 // reached: the best that was found); the codes of the eigenproblem.
-ErrorCode MatrixLogarithm(ComplexMatrix a);
+ErrorCode MatrixLogarithm(const ComplexMatrix &a);
 
 // out = a^power by repeated squaring; a negative power is one of the pseudo-inverse. out may be a.
 template <ElementType E>
-ErrorCode MatrixPower(ConstMatrixView<E> a, int32_t power, MatrixView<E> out);
+ErrorCode MatrixPower(const ConstMatrixView<E> &a, int32_t power, const MatrixView<E> &out);
 
 } // namespace qx
 

@@ -26,7 +26,7 @@ ErrorCode TakeLogarithm(CDB *z) {
 
 // The largest modulus of a - b, relative to the largest of a plus the largest of b; infinity where
 // one of them is not finite.
-double RelativeError(ConstComplexMatrix a, ConstComplexMatrix b) {
+double RelativeError(const ConstComplexMatrix &a, const ConstComplexMatrix &b) {
     if (!AllFinite<E>(a) || !AllFinite<E>(b))
         return HUGE_VAL;
     double difference = 0.0, first = 0.0, second = 0.0;
@@ -41,7 +41,7 @@ double RelativeError(ConstComplexMatrix a, ConstComplexMatrix b) {
 
 // Through eigenvectors: v log(w) v^-1. ErrConditionTooHigh, ErrDegenerateValue (an eigenvalue is
 // 0), ErrSingularMatrix, and the codes of the eigenproblem.
-ErrorCode LogByEigen(ConstComplexMatrix a, ComplexMatrix log) {
+ErrorCode LogByEigen(const ConstComplexMatrix &a, const ComplexMatrix &log) {
     const int32_t n = a.rows();
     ComplexMatrix vectors, inverse;
     ComplexVector values;
@@ -72,7 +72,7 @@ ErrorCode LogByEigen(ConstComplexMatrix a, ComplexMatrix log) {
 // 2^k times the logarithm of the k-th root of a, after as many roots as bring the norm of y = 1 -
 // root to 0.1: -(y + y^2 / 2 + ...) with ten terms. ErrIterationLimit after 100 roots, and the
 // codes of the roots.
-ErrorCode LogByRoots(ConstComplexMatrix a, ComplexMatrix log) {
+ErrorCode LogByRoots(const ConstComplexMatrix &a, const ComplexMatrix &log) {
     constexpr int32_t mostRoots = 100, terms = 10;
     constexpr double radius = 0.1;
     const int32_t n = a.rows();
@@ -119,7 +119,7 @@ ErrorCode LogByRoots(ConstComplexMatrix a, ComplexMatrix log) {
 // Refines the logarithm of one matrix.
 class Refinement {
 public:
-    explicit Refinement(ConstComplexMatrix a) : a_(a) {}
+    explicit Refinement(const ConstComplexMatrix &a) : a_(a) {}
 
     ErrorCode allocate() {
         const int32_t n = a_.rows();
@@ -173,7 +173,7 @@ private:
     }
 
     // The matrix with 1e-12 / n of a fixed sequence, the logistic map, on all its elements.
-    void perturb(ComplexMatrix perturbed) const {
+    void perturb(const ComplexMatrix &perturbed) const {
         const int32_t n = a_.rows();
         double x = 0.142857;
         for (int32_t i = 0; i < n; ++i)
@@ -215,7 +215,7 @@ private:
 };
 
 // What repeated roots give where the eigenvalues gave `failure`; the result replaces a.
-ErrorCode FallBackOnRoots(ComplexMatrix a, ComplexMatrix log, ErrorCode failure) {
+ErrorCode FallBackOnRoots(const ComplexMatrix &a, const ComplexMatrix &log, ErrorCode failure) {
     const ErrorCode status = LogByRoots(a, log);
     if (status == ErrOutOfMemory)
         return status;
@@ -227,7 +227,7 @@ ErrorCode FallBackOnRoots(ComplexMatrix a, ComplexMatrix log, ErrorCode failure)
 
 } // namespace
 
-ErrorCode MatrixLogarithm(ComplexMatrix a) {
+ErrorCode MatrixLogarithm(const ComplexMatrix &a) {
     QX_EXPECTS(a.isSquare() && !a.isEmpty());
     if (!AllFinite<E>(a))
         return ErrNonFiniteInput;

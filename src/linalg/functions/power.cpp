@@ -8,7 +8,7 @@
 namespace qx {
 
 template <ElementType E>
-ErrorCode MatrixPower(ConstMatrixView<E> a, int32_t power, MatrixView<E> out) {
+ErrorCode MatrixPower(const ConstMatrixView<E> &a, int32_t power, const MatrixView<E> &out) {
     const int32_t n = a.rows();
     QX_EXPECTS(a.isSquare() && n > 0 && out.rows() == n && out.cols() == n);
     MatrixView<E> base, result, spare;
@@ -42,7 +42,7 @@ ErrorCode MatrixPower(ConstMatrixView<E> a, int32_t power, MatrixView<E> out) {
     return 0;
 }
 
-template ErrorCode MatrixPower(ConstRealMatrix, int32_t, RealMatrix);
-template ErrorCode MatrixPower(ConstComplexMatrix, int32_t, ComplexMatrix);
+template ErrorCode MatrixPower(const ConstRealMatrix &, int32_t, const RealMatrix &);
+template ErrorCode MatrixPower(const ConstComplexMatrix &, int32_t, const ComplexMatrix &);
 
 } // namespace qx

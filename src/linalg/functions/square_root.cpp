@@ -11,7 +11,7 @@ constexpr double negligible = 1e-12;
 
 // r r = t for upper triangular t: the columns from left to right, each from the diagonal up (A.
 // Bjorck and S. Hammarling, "A Schur method for the square root of a matrix", 1983).
-void TriangularSquareRoot(ConstComplexMatrix t, ComplexMatrix r) {
+void TriangularSquareRoot(const ConstComplexMatrix &t, const ComplexMatrix &r) {
     for (CDB &element : r.elements())
         element = {0.0, 0.0};
     for (int32_t j = 0; j < t.cols(); ++j) {
@@ -29,7 +29,7 @@ void TriangularSquareRoot(ConstComplexMatrix t, ComplexMatrix r) {
 
 } // namespace
 
-ErrorCode MatrixSquareRoot(ConstComplexMatrix a, ComplexMatrix root) {
+ErrorCode MatrixSquareRoot(const ConstComplexMatrix &a, const ComplexMatrix &root) {
     const int32_t n = a.rows();
     QX_EXPECTS(a.isSquare() && n > 0 && root.rows() == n && root.cols() == n);
     ComplexMatrix u, t, r;

@@ -12,12 +12,13 @@ namespace qx {
 namespace {
 
 template <ElementType E>
-bool Fit(ConstMatrixView<E> a, ConstMatrixView<E> b, ConstMatrixView<E> c) {
+bool Fit(const ConstMatrixView<E> &a, const ConstMatrixView<E> &b, const ConstMatrixView<E> &c) {
     return a.cols() == b.rows() && a.rows() == c.rows() && b.cols() == c.cols();
 }
 
 template <ElementType E>
-void AddMultiple(double factor, ConstMatrixView<E> a, ConstMatrixView<E> b, MatrixView<E> c) {
+void AddMultiple(double factor, const ConstMatrixView<E> &a, const ConstMatrixView<E> &b,
+                 const MatrixView<E> &c) {
     QX_EXPECTS(Fit<E>(a, b, c));
     if constexpr (E == ElementType::DBL)
         AddProductReal(a.rows(), b.cols(), a.cols(), {factor}, {a.data(), a.stride(), 1},
@@ -29,14 +30,14 @@ void AddMultiple(double factor, ConstMatrixView<E> a, ConstMatrixView<E> b, Matr
 }
 
 template <ElementType E>
-void ClearRows(MatrixView<E> c) {
+void ClearRows(const MatrixView<E> &c) {
     for (int32_t i = 0; i < c.rows(); ++i)
         Fill(reinterpret_cast<DBL *>(c.row(i)), std::ptrdiff_t{c.cols()} * partsOf<E>, 0.0);
 }
 
 // kept: the empty sum is NaN and not zero
 template <ElementType E>
-void FillWithNaN(MatrixView<E> c) {
+void FillWithNaN(const MatrixView<E> &c) {
     Fill(reinterpret_cast<DBL *>(c.data()), static_cast<std::ptrdiff_t>(c.count()) * partsOf<E>,
          std::numeric_limits<double>::quiet_NaN());
 }
@@ -44,7 +45,8 @@ void FillWithNaN(MatrixView<E> c) {
 } // namespace
 
 template <ElementType E>
-void MatrixProduct(ConstMatrixView<E> a, ConstMatrixView<E> b, MatrixView<E> c) {
+void MatrixProduct(const ConstMatrixView<E> &a, const ConstMatrixView<E> &b,
+                   const MatrixView<E> &c) {
     QX_EXPECTS(Fit<E>(a, b, c) && c.isWhole());
     if (a.cols() > 0)
         OrderedProduct<E>(a, b, c);
@@ -53,7 +55,8 @@ void MatrixProduct(ConstMatrixView<E> a, ConstMatrixView<E> b, MatrixView<E> c) 
 }
 
 template <ElementType E>
-ErrorCode MatrixProductOfCopies(ConstMatrixView<E> a, ConstMatrixView<E> b, MatrixView<E> c) {
+ErrorCode MatrixProductOfCopies(const ConstMatrixView<E> &a, const ConstMatrixView<E> &b,
+                                const MatrixView<E> &c) {
     if (c.isEmpty() || a.cols() == 0) {
         MatrixProduct<E>(a, b, c);
         return 0;
@@ -72,22 +75,25 @@ ErrorCode MatrixProductOfCopies(ConstMatrixView<E> a, ConstMatrixView<E> b, Matr
 }
 
 template <ElementType E>
-void AddProduct(ConstMatrixView<E> a, ConstMatrixView<E> b, MatrixView<E> c) {
+void AddProduct(const ConstMatrixView<E> &a, const ConstMatrixView<E> &b, const MatrixView<E> &c) {
     AddMultiple<E>(1.0, a, b, c);
 }
 
 template <ElementType E>
-void SubtractProduct(ConstMatrixView<E> a, ConstMatrixView<E> b, MatrixView<E> c) {
+void SubtractProduct(const ConstMatrixView<E> &a, const ConstMatrixView<E> &b,
+                     const MatrixView<E> &c) {
     AddMultiple<E>(-1.0, a, b, c);
 }
 
 template <ElementType E>
-void OrderedProduct(ConstMatrixView<E> a, ConstMatrixView<E> b, MatrixView<E> c) {
+void OrderedProduct(const ConstMatrixView<E> &a, const ConstMatrixView<E> &b,
+                    const MatrixView<E> &c) {
     ClearRows<E>(c);
     AddProduct<E>(a, b, c);
 }
 
-void ProductWithConjugate(ConstComplexMatrix a, ConstComplexMatrix b, ComplexMatrix c) {
+void ProductWithConjugate(const ConstComplexMatrix &a, const ConstComplexMatrix &b,
+                          const ComplexMatrix &c) {
     QX_EXPECTS(a.cols() == b.cols() && c.rows() == a.rows() && c.cols() == b.rows());
     ClearRows<ElementType::CDB>(c);
     AddProductComplex(a.rows(), b.rows(), a.cols(), {1.0, 0.0}, {a.data(), a.stride(), 1, false},
@@ -96,7 +102,7 @@ void ProductWithConjugate(ConstComplexMatrix a, ConstComplexMatrix b, ComplexMat
 
 // Four rows at a time: four sums that do not wait for each other.
 template <ElementType E>
-void MatrixVectorProduct(ConstMatrixView<E> a, ConstVectorView<E> x, VectorView<E> y) {
+void MatrixVectorProduct(const ConstMatrixView<E> &a, ConstVectorView<E> x, VectorView<E> y) {
     QX_EXPECTS(a.cols() == x.size() && a.rows() == y.size());
     if (a.isEmpty())
         return;
@@ -120,17 +126,23 @@ void MatrixVectorProduct(ConstMatrixView<E> a, ConstVectorView<E> x, VectorView<
         dot(std::integral_constant<int, 1>(), i);
 }
 
-template void MatrixProduct(ConstRealMatrix, ConstRealMatrix, RealMatrix);
-template void MatrixProduct(ConstComplexMatrix, ConstComplexMatrix, ComplexMatrix);
-template ErrorCode MatrixProductOfCopies(ConstRealMatrix, ConstRealMatrix, RealMatrix);
-template ErrorCode MatrixProductOfCopies(ConstComplexMatrix, ConstComplexMatrix, ComplexMatrix);
-template void AddProduct(ConstRealMatrix, ConstRealMatrix, RealMatrix);
-template void AddProduct(ConstComplexMatrix, ConstComplexMatrix, ComplexMatrix);
-template void SubtractProduct(ConstRealMatrix, ConstRealMatrix, RealMatrix);
-template void SubtractProduct(ConstComplexMatrix, ConstComplexMatrix, ComplexMatrix);
-template void OrderedProduct(ConstRealMatrix, ConstRealMatrix, RealMatrix);
-template void OrderedProduct(ConstComplexMatrix, ConstComplexMatrix, ComplexMatrix);
-template void MatrixVectorProduct(ConstRealMatrix, ConstRealVector, RealVector);
-template void MatrixVectorProduct(ConstComplexMatrix, ConstComplexVector, ComplexVector);
+template void MatrixProduct(const ConstRealMatrix &, const ConstRealMatrix &, const RealMatrix &);
+template void MatrixProduct(const ConstComplexMatrix &, const ConstComplexMatrix &,
+                            const ComplexMatrix &);
+template ErrorCode MatrixProductOfCopies(const ConstRealMatrix &, const ConstRealMatrix &,
+                                         const RealMatrix &);
+template ErrorCode MatrixProductOfCopies(const ConstComplexMatrix &, const ConstComplexMatrix &,
+                                         const ComplexMatrix &);
+template void AddProduct(const ConstRealMatrix &, const ConstRealMatrix &, const RealMatrix &);
+template void AddProduct(const ConstComplexMatrix &, const ConstComplexMatrix &,
+                         const ComplexMatrix &);
+template void SubtractProduct(const ConstRealMatrix &, const ConstRealMatrix &, const RealMatrix &);
+template void SubtractProduct(const ConstComplexMatrix &, const ConstComplexMatrix &,
+                              const ComplexMatrix &);
+template void OrderedProduct(const ConstRealMatrix &, const ConstRealMatrix &, const RealMatrix &);
+template void OrderedProduct(const ConstComplexMatrix &, const ConstComplexMatrix &,
+                             const ComplexMatrix &);
+template void MatrixVectorProduct(const ConstRealMatrix &, ConstRealVector, RealVector);
+template void MatrixVectorProduct(const ConstComplexMatrix &, ConstComplexVector, ComplexVector);
 
 } // namespace qx

@@ -8,28 +8,33 @@ namespace qx {
 
 // c = a b, in the order of arithmetic of AddProduct; where a has no columns, c is NaN.
 template <ElementType E>
-void MatrixProduct(ConstMatrixView<E> a, ConstMatrixView<E> b, MatrixView<E> c);
+void MatrixProduct(const ConstMatrixView<E> &a, const ConstMatrixView<E> &b,
+                   const MatrixView<E> &c);
 // The same on copies of the operands in fresh blocks. ErrOutOfMemory.
 template <ElementType E>
-ErrorCode MatrixProductOfCopies(ConstMatrixView<E> a, ConstMatrixView<E> b, MatrixView<E> c);
+ErrorCode MatrixProductOfCopies(const ConstMatrixView<E> &a, const ConstMatrixView<E> &b,
+                                const MatrixView<E> &c);
 
 // c += a b and c -= a b with the order of arithmetic of the plain triple loop: to every c[i][j] the
 // terms a[i][p] b[p][j] are added one by one, p ascending. c shares no element with them.
 template <ElementType E>
-void AddProduct(ConstMatrixView<E> a, ConstMatrixView<E> b, MatrixView<E> c);
+void AddProduct(const ConstMatrixView<E> &a, const ConstMatrixView<E> &b, const MatrixView<E> &c);
 template <ElementType E>
-void SubtractProduct(ConstMatrixView<E> a, ConstMatrixView<E> b, MatrixView<E> c);
+void SubtractProduct(const ConstMatrixView<E> &a, const ConstMatrixView<E> &b,
+                     const MatrixView<E> &c);
 // c = a b in this order; without terms 0.
 template <ElementType E>
-void OrderedProduct(ConstMatrixView<E> a, ConstMatrixView<E> b, MatrixView<E> c);
+void OrderedProduct(const ConstMatrixView<E> &a, const ConstMatrixView<E> &b,
+                    const MatrixView<E> &c);
 
 // c = a b^H in this order.
-void ProductWithConjugate(ConstComplexMatrix a, ConstComplexMatrix b, ComplexMatrix c);
+void ProductWithConjugate(const ConstComplexMatrix &a, const ConstComplexMatrix &b,
+                          const ComplexMatrix &c);
 
 // y = a x: one sum per row, its terms added in ascending order. A matrix without columns writes
 // nothing.
 template <ElementType E>
-void MatrixVectorProduct(ConstMatrixView<E> a, ConstVectorView<E> x, VectorView<E> y);
+void MatrixVectorProduct(const ConstMatrixView<E> &a, ConstVectorView<E> x, VectorView<E> y);
 
 } // namespace qx
 

@@ -19,7 +19,7 @@ double LargestModulus(ConstVectorView<E> x) {
 // Whether all pairs agree within the limit, the element beyond the diagonal being compared as it is
 // or conjugated.
 template <ElementType E>
-bool PairsAgree(ConstMatrixView<E> a, double limit, bool hermitian) {
+bool PairsAgree(const ConstMatrixView<E> &a, double limit, bool hermitian) {
     for (int32_t i = 0; i < a.rows(); ++i)
         for (int32_t j = hermitian ? i : i + 1; j < a.cols(); ++j) {
             const auto mirror = a(j, i);
@@ -30,7 +30,7 @@ bool PairsAgree(ConstMatrixView<E> a, double limit, bool hermitian) {
 }
 
 template <ElementType E>
-bool IsExactlyHermitian(ConstMatrixView<E> a) {
+bool IsExactlyHermitian(const ConstMatrixView<E> &a) {
     for (int32_t i = 0; i < a.rows(); ++i) {
         if (!(ImagPart(a(i, i)) == 0.0))
             return false;
@@ -47,7 +47,7 @@ bool IsExactlyHermitian(ConstMatrixView<E> a) {
 template <ElementType E>
 class Elimination {
 public:
-    explicit Elimination(MatrixView<E> a) : a_(a), n_(a.rows()) {}
+    explicit Elimination(const MatrixView<E> &a) : a_(a), n_(a.rows()) {}
 
     // The index of the largest diagonal element that is left, or -1 where one is below the limit.
     int32_t largestDiagonal(int32_t first, double lowest) const {
@@ -91,8 +91,8 @@ private:
 } // namespace
 
 template <ElementType E>
-ErrorCode CheckSymmetric(ConstMatrixView<E> a, double tolerance, bool relative, bool hermitian,
-                         int32_t *isSymmetric) {
+ErrorCode CheckSymmetric(const ConstMatrixView<E> &a, double tolerance, bool relative,
+                         bool hermitian, int32_t *isSymmetric) {
     QX_EXPECTS(a.isSquare() && !a.isEmpty());
     if (!AllFinite<E>(a))
         return ErrNonFiniteInput;
@@ -107,7 +107,7 @@ ErrorCode CheckSymmetric(ConstMatrixView<E> a, double tolerance, bool relative, 
 }
 
 template <ElementType E>
-ErrorCode CheckPositiveDefinite(ConstMatrixView<E> a, int32_t *isDefinite) {
+ErrorCode CheckPositiveDefinite(const ConstMatrixView<E> &a, int32_t *isDefinite) {
     QX_EXPECTS(a.isSquare() && !a.isEmpty());
     *isDefinite = 0;
     if (!IsExactlyHermitian<E>(a))
@@ -128,8 +128,8 @@ ErrorCode CheckPositiveDefinite(ConstMatrixView<E> a, int32_t *isDefinite) {
 }
 
 template <ElementType E>
-ErrorCode CheckPositiveSemiDefinite(ConstMatrixView<E> a, double tolerance, int32_t *isSemiDefinite,
-                                    int32_t *rank) {
+ErrorCode CheckPositiveSemiDefinite(const ConstMatrixView<E> &a, double tolerance,
+                                    int32_t *isSemiDefinite, int32_t *rank) {
     QX_EXPECTS(a.isSquare() && !a.isEmpty());
     *isSemiDefinite = 0;
     *rank = -1;
@@ -166,11 +166,12 @@ ErrorCode CheckPositiveSemiDefinite(ConstMatrixView<E> a, double tolerance, int3
     return 0;
 }
 
-template ErrorCode CheckSymmetric(ConstRealMatrix, double, bool, bool, int32_t *);
-template ErrorCode CheckSymmetric(ConstComplexMatrix, double, bool, bool, int32_t *);
-template ErrorCode CheckPositiveDefinite(ConstRealMatrix, int32_t *);
-template ErrorCode CheckPositiveDefinite(ConstComplexMatrix, int32_t *);
-template ErrorCode CheckPositiveSemiDefinite(ConstRealMatrix, double, int32_t *, int32_t *);
-template ErrorCode CheckPositiveSemiDefinite(ConstComplexMatrix, double, int32_t *, int32_t *);
+template ErrorCode CheckSymmetric(const ConstRealMatrix &, double, bool, bool, int32_t *);
+template ErrorCode CheckSymmetric(const ConstComplexMatrix &, double, bool, bool, int32_t *);
+template ErrorCode CheckPositiveDefinite(const ConstRealMatrix &, int32_t *);
+template ErrorCode CheckPositiveDefinite(const ConstComplexMatrix &, int32_t *);
+template ErrorCode CheckPositiveSemiDefinite(const ConstRealMatrix &, double, int32_t *, int32_t *);
+template ErrorCode CheckPositiveSemiDefinite(const ConstComplexMatrix &, double, int32_t *,
+                                             int32_t *);
 
 } // namespace qx

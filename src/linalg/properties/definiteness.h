@@ -12,14 +12,14 @@ namespace qx {
 // epsilon. `hermitian` compares with the conjugate, and so looks at the diagonal, too.
 // ErrNonFiniteInput.
 template <ElementType E>
-ErrorCode CheckSymmetric(ConstMatrixView<E> a, double tolerance, bool relative, bool hermitian,
-                         int32_t *isSymmetric);
+ErrorCode CheckSymmetric(const ConstMatrixView<E> &a, double tolerance, bool relative,
+                         bool hermitian, int32_t *isSymmetric);
 
 // Whether a matrix is exactly symmetric (Hermitian) and all its eigenvalues are above the machine
 // epsilon times the largest modulus of them. NaN counts as a difference.
 // ErrNonFiniteInput, ErrOutOfMemory, ErrIterationLimit.
 template <ElementType E>
-ErrorCode CheckPositiveDefinite(ConstMatrixView<E> a, int32_t *isDefinite);
+ErrorCode CheckPositiveDefinite(const ConstMatrixView<E> &a, int32_t *isDefinite);
 
 // Whether a matrix is positive semi-definite, by an elimination that takes the largest diagonal
 // element first. With t the tolerance (n machine epsilons if negative) times the largest diagonal
@@ -28,8 +28,8 @@ ErrorCode CheckPositiveDefinite(ConstMatrixView<E> a, int32_t *isDefinite);
 // The rank is -1 where the answer is 0.
 // ErrNonFiniteInput, ErrOutOfMemory.
 template <ElementType E>
-ErrorCode CheckPositiveSemiDefinite(ConstMatrixView<E> a, double tolerance, int32_t *isSemiDefinite,
-                                    int32_t *rank);
+ErrorCode CheckPositiveSemiDefinite(const ConstMatrixView<E> &a, double tolerance,
+                                    int32_t *isSemiDefinite, int32_t *rank);
 
 } // namespace qx
 

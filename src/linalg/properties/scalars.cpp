@@ -14,7 +14,7 @@ namespace {
 constexpr double infinity = std::numeric_limits<double>::infinity();
 
 template <ElementType E>
-typename ScalarOf<E>::type ProductOfDiagonal(ConstMatrixView<E> a) {
+typename ScalarOf<E>::type ProductOfDiagonal(const ConstMatrixView<E> &a) {
     auto product = ScalarOf<E>::Of(1.0);
     for (int32_t i = 0; i < a.rows(); ++i)
         product = product * a(i, i);
@@ -22,7 +22,7 @@ typename ScalarOf<E>::type ProductOfDiagonal(ConstMatrixView<E> a) {
 }
 
 template <ElementType E>
-ErrorCode DeterminantByLU(ConstMatrixView<E> a, ElementOf<E> *det) {
+ErrorCode DeterminantByLU(const ConstMatrixView<E> &a, ElementOf<E> *det) {
     MatrixView<E> lu;
     IndexVector pivots;
     ScratchParts memory;
@@ -41,7 +41,7 @@ ErrorCode DeterminantByLU(ConstMatrixView<E> a, ElementOf<E> *det) {
 }
 
 template <ElementType E>
-ErrorCode DeterminantByCholesky(ConstMatrixView<E> a, ElementOf<E> *det) {
+ErrorCode DeterminantByCholesky(const ConstMatrixView<E> &a, ElementOf<E> *det) {
     const int32_t n = a.rows();
     VectorView<E> packed;
     ScratchParts memory;
@@ -62,7 +62,7 @@ ErrorCode DeterminantByCholesky(ConstMatrixView<E> a, ElementOf<E> *det) {
 
 // The largest sum of moduli of a row, or of a column.
 template <ElementType E>
-double LargestRowSum(ConstMatrixView<E> a) {
+double LargestRowSum(const ConstMatrixView<E> &a) {
     double largest = 0.0;
     for (int32_t i = 0; i < a.rows(); ++i) {
         double sum = 0.0;
@@ -73,7 +73,7 @@ double LargestRowSum(ConstMatrixView<E> a) {
     return largest;
 }
 template <ElementType E>
-double LargestColumnSum(ConstMatrixView<E> a) {
+double LargestColumnSum(const ConstMatrixView<E> &a) {
     double largest = 0.0;
     for (int32_t j = 0; j < a.cols(); ++j) {
         double sum = 0.0;
@@ -84,7 +84,7 @@ double LargestColumnSum(ConstMatrixView<E> a) {
     return largest;
 }
 template <ElementType E>
-double Frobenius(ConstMatrixView<E> a) {
+double Frobenius(const ConstMatrixView<E> &a) {
     double sum = 0.0;
     for (int32_t i = 0; i < a.rows(); ++i)
         for (int32_t j = 0; j < a.cols(); ++j)
@@ -95,7 +95,7 @@ double Frobenius(ConstMatrixView<E> a) {
 // Of finite elements.
 template <ElementType E>
 struct Values {
-    ErrorCode find(ConstMatrixView<E> a) {
+    ErrorCode find(const ConstMatrixView<E> &a) {
         if (const ErrorCode failed = memory.take(Sized(s, std::min(a.rows(), a.cols()))))
             return failed;
         return SingularValues<E>(a, s);
@@ -107,7 +107,7 @@ struct Values {
 };
 
 template <ElementType E>
-ErrorCode ConditionByInverse(ConstMatrixView<E> a, int32_t normType, double *cond) {
+ErrorCode ConditionByInverse(const ConstMatrixView<E> &a, int32_t normType, double *cond) {
     double norm, inverseNorm;
     if (const ErrorCode failed = MatrixNorm<E>(a, normType, &norm))
         return failed;
@@ -132,7 +132,7 @@ ErrorCode ConditionByInverse(ConstMatrixView<E> a, int32_t normType, double *con
 } // namespace
 
 template <ElementType E>
-ErrorCode MatrixDeterminant(ConstMatrixView<E> a, MatrixType type, ElementOf<E> *det) {
+ErrorCode MatrixDeterminant(const ConstMatrixView<E> &a, MatrixType type, ElementOf<E> *det) {
     QX_EXPECTS(a.isSquare() && !a.isEmpty());
     if (!AllFinite<E>(a))
         return ErrNonFiniteInput;
@@ -149,7 +149,7 @@ ErrorCode MatrixDeterminant(ConstMatrixView<E> a, MatrixType type, ElementOf<E> 
 }
 
 template <ElementType E>
-ErrorCode MatrixNorm(ConstMatrixView<E> a, int32_t normType, double *norm) {
+ErrorCode MatrixNorm(const ConstMatrixView<E> &a, int32_t normType, double *norm) {
     QX_EXPECTS(!a.isEmpty());
     if (!AllFinite<E>(a))
         return ErrNonFiniteInput;
@@ -175,7 +175,7 @@ ErrorCode MatrixNorm(ConstMatrixView<E> a, int32_t normType, double *norm) {
 }
 
 template <ElementType E>
-ErrorCode ConditionNumber(ConstMatrixView<E> a, int32_t normType, double *cond) {
+ErrorCode ConditionNumber(const ConstMatrixView<E> &a, int32_t normType, double *cond) {
     QX_EXPECTS(!a.isEmpty());
     if (!AllFinite<E>(a))
         return ErrNonFiniteInput;
@@ -191,7 +191,7 @@ ErrorCode ConditionNumber(ConstMatrixView<E> a, int32_t normType, double *cond) 
 }
 
 template <ElementType E>
-ErrorCode MatrixRank(ConstMatrixView<E> a, double tolerance, int32_t *rank) {
+ErrorCode MatrixRank(const ConstMatrixView<E> &a, double tolerance, int32_t *rank) {
     QX_EXPECTS(!a.isEmpty());
     if (!AllFinite<E>(a))
         return ErrNonFiniteInput;
@@ -206,13 +206,13 @@ ErrorCode MatrixRank(ConstMatrixView<E> a, double tolerance, int32_t *rank) {
     return 0;
 }
 
-template ErrorCode MatrixDeterminant(ConstRealMatrix, MatrixType, DBL *);
-template ErrorCode MatrixDeterminant(ConstComplexMatrix, MatrixType, CDB *);
-template ErrorCode MatrixNorm(ConstRealMatrix, int32_t, double *);
-template ErrorCode MatrixNorm(ConstComplexMatrix, int32_t, double *);
-template ErrorCode ConditionNumber(ConstRealMatrix, int32_t, double *);
-template ErrorCode ConditionNumber(ConstComplexMatrix, int32_t, double *);
-template ErrorCode MatrixRank(ConstRealMatrix, double, int32_t *);
-template ErrorCode MatrixRank(ConstComplexMatrix, double, int32_t *);
+template ErrorCode MatrixDeterminant(const ConstRealMatrix &, MatrixType, DBL *);
+template ErrorCode MatrixDeterminant(const ConstComplexMatrix &, MatrixType, CDB *);
+template ErrorCode MatrixNorm(const ConstRealMatrix &, int32_t, double *);
+template ErrorCode MatrixNorm(const ConstComplexMatrix &, int32_t, double *);
+template ErrorCode ConditionNumber(const ConstRealMatrix &, int32_t, double *);
+template ErrorCode ConditionNumber(const ConstComplexMatrix &, int32_t, double *);
+template ErrorCode MatrixRank(const ConstRealMatrix &, double, int32_t *);
+template ErrorCode MatrixRank(const ConstComplexMatrix &, double, int32_t *);
 
 } // namespace qx

@@ -14,23 +14,23 @@ enum class MatrixType : int32_t { general, positiveDefinite, lowerTriangular, up
 // alone. 0 for a singular matrix of the first type.
 // ErrNonFiniteInput, ErrOutOfMemory, ErrNotPositiveDefinite.
 template <ElementType E>
-ErrorCode MatrixDeterminant(ConstMatrixView<E> a, MatrixType type, ElementOf<E> *det);
+ErrorCode MatrixDeterminant(const ConstMatrixView<E> &a, MatrixType type, ElementOf<E> *det);
 
 enum NormType : int32_t { twoNorm, oneNorm, frobeniusNorm, infinityNorm };
 // ErrNonFiniteInput, ErrInvalidSelector; of the 2-norm ErrOutOfMemory, ErrIterationLimit.
 template <ElementType E>
-ErrorCode MatrixNorm(ConstMatrixView<E> a, int32_t normType, double *norm);
+ErrorCode MatrixNorm(const ConstMatrixView<E> &a, int32_t normType, double *norm);
 
 // The quotient of the extreme singular values, or norm(a) norm(a^-1) of a square matrix; infinity
 // for a singular one. ErrNonFiniteInput, ErrInvalidSelector, ErrNotSquare, ErrOutOfMemory,
 // ErrIterationLimit.
 template <ElementType E>
-ErrorCode ConditionNumber(ConstMatrixView<E> a, int32_t normType, double *cond);
+ErrorCode ConditionNumber(const ConstMatrixView<E> &a, int32_t normType, double *cond);
 
 // The number of singular values above the tolerance, which is max(m, n) times the largest one times
 // the machine epsilon if negative. ErrNonFiniteInput, ErrOutOfMemory, ErrIterationLimit.
 template <ElementType E>
-ErrorCode MatrixRank(ConstMatrixView<E> a, double tolerance, int32_t *rank);
+ErrorCode MatrixRank(const ConstMatrixView<E> &a, double tolerance, int32_t *rank);
 
 } // namespace qx
 

@@ -8,7 +8,7 @@ namespace {
 
 // Fills a matrix with what at(i, j) gives.
 template <ElementType E, class At>
-void FillEach(MatrixView<E> out, At at) {
+void FillEach(const MatrixView<E> &out, At at) {
     for (int32_t i = 0; i < out.rows(); ++i)
         for (int32_t j = 0; j < out.cols(); ++j)
             out(i, j) = at(i, j);
@@ -39,17 +39,17 @@ typename ScalarOf<E>::type Correlation(ConstVectorView<E> x, ConstVectorView<E> 
 } // namespace
 
 template <ElementType E>
-void FillDiagonal(ConstVectorView<E> x, MatrixView<E> out) {
+void FillDiagonal(ConstVectorView<E> x, const MatrixView<E> &out) {
     FillEach<E>(out, [x](auto i, auto j) { return i == j ? x[i] : ScalarOf<E>::Of(0.0); });
 }
 
 template <ElementType E>
-void FillToeplitz(ConstVectorView<E> x, ConstVectorView<E> y, MatrixView<E> out) {
+void FillToeplitz(ConstVectorView<E> x, ConstVectorView<E> y, const MatrixView<E> &out) {
     FillEach<E>(out, [x, y](auto i, auto j) { return j > i ? y[j - i] : x[i - j]; });
 }
 
 template <ElementType E>
-void FillVandermonde(ConstVectorView<E> x, MatrixView<E> out) {
+void FillVandermonde(ConstVectorView<E> x, const MatrixView<E> &out) {
     for (int32_t i = 0; i < out.rows(); ++i) {
         auto power = ScalarOf<E>::Of(1.0);
         for (int32_t j = out.cols() - 1; j >= 0; --j) {
@@ -60,7 +60,7 @@ void FillVandermonde(ConstVectorView<E> x, MatrixView<E> out) {
 }
 
 template <ElementType E>
-void FillCompanion(ConstVectorView<E> x, MatrixView<E> out) {
+void FillCompanion(ConstVectorView<E> x, const MatrixView<E> &out) {
     FillEach<E>(out, [x](auto i, auto j) {
         if (i == 0)
             return static_cast<typename ScalarOf<E>::type>(-x[j + 1] / x[0]);
@@ -68,7 +68,7 @@ void FillCompanion(ConstVectorView<E> x, MatrixView<E> out) {
     });
 }
 
-void FillWithEigenvalues(ConstRealVector values, RealMatrix out) {
+void FillWithEigenvalues(ConstRealVector values, const RealMatrix &out) {
     double sum = 0.0;
     for (const DBL &value : values)
         sum += value;
@@ -81,7 +81,7 @@ void FillWithEigenvalues(ConstRealVector values, RealMatrix out) {
 }
 
 template <ElementType E>
-ErrorCode CharacteristicPolynomial(ConstMatrixView<E> a, VectorView<E> polynomial) {
+ErrorCode CharacteristicPolynomial(const ConstMatrixView<E> &a, VectorView<E> polynomial) {
     const int32_t n = a.rows();
     QX_EXPECTS(a.isSquare() && n > 0 && polynomial.size() == std::ptrdiff_t{n} + 1);
     ComplexVector p, values;
@@ -107,7 +107,7 @@ ErrorCode CharacteristicPolynomial(ConstMatrixView<E> a, VectorView<E> polynomia
 
 template <ElementType E>
 ErrorCode CorrelationMatrix(ConstVectorView<E> x, ConstVectorView<E> y, CorrelationScale scale,
-                            MatrixView<E> out) {
+                            const MatrixView<E> &out) {
     QX_EXPECTS(x.size() == y.size() && out.isSquare() && out.rows() <= x.size());
     VectorView<E> column, row;
     ScratchParts memory;
@@ -121,19 +121,19 @@ ErrorCode CorrelationMatrix(ConstVectorView<E> x, ConstVectorView<E> y, Correlat
     return 0;
 }
 
-template void FillDiagonal(ConstRealVector, RealMatrix);
-template void FillDiagonal(ConstComplexVector, ComplexMatrix);
-template void FillToeplitz(ConstRealVector, ConstRealVector, RealMatrix);
-template void FillToeplitz(ConstComplexVector, ConstComplexVector, ComplexMatrix);
-template void FillVandermonde(ConstRealVector, RealMatrix);
-template void FillVandermonde(ConstComplexVector, ComplexMatrix);
-template void FillCompanion(ConstRealVector, RealMatrix);
-template void FillCompanion(ConstComplexVector, ComplexMatrix);
-template ErrorCode CharacteristicPolynomial(ConstRealMatrix, RealVector);
-template ErrorCode CharacteristicPolynomial(ConstComplexMatrix, ComplexVector);
+template void FillDiagonal(ConstRealVector, const RealMatrix &);
+template void FillDiagonal(ConstComplexVector, const ComplexMatrix &);
+template void FillToeplitz(ConstRealVector, ConstRealVector, const RealMatrix &);
+template void FillToeplitz(ConstComplexVector, ConstComplexVector, const ComplexMatrix &);
+template void FillVandermonde(ConstRealVector, const RealMatrix &);
+template void FillVandermonde(ConstComplexVector, const ComplexMatrix &);
+template void FillCompanion(ConstRealVector, const RealMatrix &);
+template void FillCompanion(ConstComplexVector, const ComplexMatrix &);
+template ErrorCode CharacteristicPolynomial(const ConstRealMatrix &, RealVector);
+template ErrorCode CharacteristicPolynomial(const ConstComplexMatrix &, ComplexVector);
 template ErrorCode CorrelationMatrix(ConstRealVector, ConstRealVector, CorrelationScale,
-                                     RealMatrix);
+                                     const RealMatrix &);
 template ErrorCode CorrelationMatrix(ConstComplexVector, ConstComplexVector, CorrelationScale,
-                                     ComplexMatrix);
+                                     const ComplexMatrix &);
 
 } // namespace qx

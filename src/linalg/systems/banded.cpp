@@ -10,7 +10,7 @@ namespace {
 // LAPACK's storage has `lower` rows more at the top, for what the row exchanges fill in, and is
 // column after column: one of our rows for each of its columns.
 template <ElementType E>
-void FillStorage(ConstMatrixView<E> band, int32_t lower, MatrixView<E> storage) {
+void FillStorage(const ConstMatrixView<E> &band, int32_t lower, const MatrixView<E> &storage) {
     for (int32_t j = 0; j < storage.rows(); ++j) {
         for (int32_t i = 0; i < lower; ++i)
             storage(j, i) = ScalarOf<E>::Of(0.0);
@@ -38,7 +38,8 @@ constexpr auto Index = ElementType::I32;
 } // namespace
 
 template <ElementType E>
-ErrorCode SolveBand(ConstMatrixView<E> band, int32_t lower, int32_t upper, MatrixView<E> b) {
+ErrorCode SolveBand(const ConstMatrixView<E> &band, int32_t lower, int32_t upper,
+                    const MatrixView<E> &b) {
     const int32_t n = band.cols();
     QX_EXPECTS(lower >= 0 && upper >= 0 && band.rows() == lower + upper + 1 && band.rows() <= n);
     QX_EXPECTS(b.rows() == n && !b.isEmpty());
@@ -81,7 +82,7 @@ ErrorCode FactorTridiagonal(const Diagonals<true> &matrix, IndexVector pivots) {
 }
 
 ErrorCode SolveTridiagonal(bool transposed, const Diagonals<false> &factors,
-                           ConstIndexVector pivots, RealMatrix b) {
+                           ConstIndexVector pivots, const RealMatrix &b) {
     const int32_t n = b.rows();
     QX_EXPECTS(factors.main.size() == n && pivots.size() == n);
     for (int32_t i = 0; i < n; ++i)
@@ -102,7 +103,7 @@ ErrorCode SolveTridiagonal(bool transposed, const Diagonals<false> &factors,
     return 0;
 }
 
-template ErrorCode SolveBand(ConstRealMatrix, int32_t, int32_t, RealMatrix);
-template ErrorCode SolveBand(ConstComplexMatrix, int32_t, int32_t, ComplexMatrix);
+template ErrorCode SolveBand(const ConstRealMatrix &, int32_t, int32_t, const RealMatrix &);
+template ErrorCode SolveBand(const ConstComplexMatrix &, int32_t, int32_t, const ComplexMatrix &);
 
 } // namespace qx

@@ -8,7 +8,8 @@ namespace qx {
 // Solves a band system in place of b. Row upper + i - j, column j of `band` holds a(i, j); band has
 // lower + upper + 1 rows, and at least as many columns. ErrOutOfMemory, ErrSingularMatrix.
 template <ElementType E>
-ErrorCode SolveBand(ConstMatrixView<E> band, int32_t lower, int32_t upper, MatrixView<E> b);
+ErrorCode SolveBand(const ConstMatrixView<E> &band, int32_t lower, int32_t upper,
+                    const MatrixView<E> &b);
 
 // A tridiagonal matrix of order n by its diagonals, of which `lower` and `upper` have n - 1
 // elements; `upper2`, which only the factors have, n - 2.
@@ -21,7 +22,7 @@ struct Diagonals {
 ErrorCode FactorTridiagonal(const Diagonals<true> &matrix, IndexVector pivots);
 // Solves with them in place of b. ErrIndexOutOfRange (no such pivots), ErrOutOfMemory.
 ErrorCode SolveTridiagonal(bool transposed, const Diagonals<false> &factors,
-                           ConstIndexVector pivots, RealMatrix b);
+                           ConstIndexVector pivots, const RealMatrix &b);
 
 } // namespace qx
 

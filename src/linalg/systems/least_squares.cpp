@@ -41,7 +41,7 @@ double OrEpsilon(double tolerance) { return tolerance <= 0.0 ? epsilon : toleran
 // The decomposition in scratch memory, with U^H beside U.
 template <ElementType E>
 struct OwnDecomposition : Decomposition<E> {
-    ErrorCode make(ConstMatrixView<E> a) {
+    ErrorCode make(const ConstMatrixView<E> &a) {
         const int32_t m = a.rows(), n = a.cols(), k = std::min(m, n);
         if (const ErrorCode failed = memory.take(Sized(this->u, m, k), Sized(this->s, k),
                                                  Sized(this->v, n, k), Sized(adjoint, k, m)))
@@ -58,7 +58,7 @@ struct OwnDecomposition : Decomposition<E> {
 };
 
 // The decomposition in the memory that is shown to the user, the rest of which becomes 0.
-ErrorCode DecomposeIn(RealVector work, ConstRealMatrix a, ConstRealVector b,
+ErrorCode DecomposeIn(RealVector work, const ConstRealMatrix &a, ConstRealVector b,
                       Decomposition<Real> &svd) {
     if (!AllFinite<Real>(a) || !AllFinite<Real>(b))
         return ErrNonFiniteInput;
@@ -90,8 +90,8 @@ void AddSolution(const Decomposition<Real> &svd, ConstRealVector scale, ConstRea
 } // namespace
 
 template <ElementType E>
-ErrorCode SolveBySVD(ConstMatrixView<E> a, ConstMatrixView<E> b, MatrixView<E> x,
-                     double tolerance) {
+ErrorCode SolveBySVD(const ConstMatrixView<E> &a, const ConstMatrixView<E> &b,
+                     const MatrixView<E> &x, double tolerance) {
     QX_EXPECTS(b.rows() == a.rows() && x.rows() == a.cols() && x.cols() == b.cols());
     if (!AllFinite<E>(a) || !AllFinite<E>(b))
         return ErrNonFiniteInput;
@@ -109,7 +109,8 @@ ErrorCode SolveBySVD(ConstMatrixView<E> a, ConstMatrixView<E> b, MatrixView<E> x
 }
 
 template <ElementType E>
-ErrorCode PseudoInverseMatrix(ConstMatrixView<E> a, double tolerance, MatrixView<E> out) {
+ErrorCode PseudoInverseMatrix(const ConstMatrixView<E> &a, double tolerance,
+                              const MatrixView<E> &out) {
     QX_EXPECTS(out.rows() == a.cols() && out.cols() == a.rows());
     if (!AllFinite<E>(a))
         return ErrNonFiniteInput;
@@ -129,7 +130,7 @@ int64_t LeastSquaresWork(int32_t m, int32_t n) {
     return k * (int64_t{m} + n + 1) + int64_t{m} * n + transposing + decomposing;
 }
 
-ErrorCode SolveBySVDIn(RealVector work, ConstRealMatrix a, ConstRealVector b, RealVector x,
+ErrorCode SolveBySVDIn(RealVector work, const ConstRealMatrix &a, ConstRealVector b, RealVector x,
                        double tolerance) {
     QX_EXPECTS(work.size() == LeastSquaresWork(a.rows(), a.cols()));
     Decomposition<Real> svd;
@@ -142,8 +143,8 @@ ErrorCode SolveBySVDIn(RealVector work, ConstRealMatrix a, ConstRealVector b, Re
     return status;
 }
 
-ErrorCode SolveBySVDRefined(RealVector work, ConstRealMatrix a, ConstRealVector b, RealVector x,
-                            double tolerance, int32_t refinements) {
+ErrorCode SolveBySVDRefined(RealVector work, const ConstRealMatrix &a, ConstRealVector b,
+                            RealVector x, double tolerance, int32_t refinements) {
     const int32_t m = a.rows(), n = a.cols();
     QX_EXPECTS(work.size() == LeastSquaresWork(m, n) + m + n);
     Decomposition<Real> svd;
@@ -189,9 +190,11 @@ ErrorCode SolveBySVDRefined(RealVector work, ConstRealMatrix a, ConstRealVector 
     return status;
 }
 
-template ErrorCode SolveBySVD(ConstRealMatrix, ConstRealMatrix, RealMatrix, double);
-template ErrorCode SolveBySVD(ConstComplexMatrix, ConstComplexMatrix, ComplexMatrix, double);
-template ErrorCode PseudoInverseMatrix(ConstRealMatrix, double, RealMatrix);
-template ErrorCode PseudoInverseMatrix(ConstComplexMatrix, double, ComplexMatrix);
+template ErrorCode SolveBySVD(const ConstRealMatrix &, const ConstRealMatrix &, const RealMatrix &,
+                              double);
+template ErrorCode SolveBySVD(const ConstComplexMatrix &, const ConstComplexMatrix &,
+                              const ComplexMatrix &, double);
+template ErrorCode PseudoInverseMatrix(const ConstRealMatrix &, double, const RealMatrix &);
+template ErrorCode PseudoInverseMatrix(const ConstComplexMatrix &, double, const ComplexMatrix &);
 
 } // namespace qx

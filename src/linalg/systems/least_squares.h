@@ -12,26 +12,28 @@ namespace qx {
 // ErrNonFiniteInput, ErrOutOfMemory, ErrIterationLimit; WarnRankDeficient where singular values are
 // left out, with x valid.
 template <ElementType E>
-ErrorCode SolveBySVD(ConstMatrixView<E> a, ConstMatrixView<E> b, MatrixView<E> x, double tolerance);
+ErrorCode SolveBySVD(const ConstMatrixView<E> &a, const ConstMatrixView<E> &b,
+                     const MatrixView<E> &x, double tolerance);
 
 // The same for one right side with U, the singular values and V in the caller's memory, which has
 // LeastSquaresWork elements and is shown to the user; what the method does not need is 0.
 int64_t LeastSquaresWork(int32_t m, int32_t n);
-ErrorCode SolveBySVDIn(RealVector work, ConstRealMatrix a, ConstRealVector b, RealVector x,
+ErrorCode SolveBySVDIn(RealVector work, const ConstRealMatrix &a, ConstRealVector b, RealVector x,
                        double tolerance);
 
 // The same, refined: x starts at 0 and is improved `refinements` times by the solution for the rest
 // b - a x. Singular values up to tolerance times the largest one are left out; a tolerance below 0
 // is the machine epsilon, and one of 0 stays. m + n more elements of work.
-ErrorCode SolveBySVDRefined(RealVector work, ConstRealMatrix a, ConstRealVector b, RealVector x,
-                            double tolerance, int32_t refinements);
+ErrorCode SolveBySVDRefined(RealVector work, const ConstRealMatrix &a, ConstRealVector b,
+                            RealVector x, double tolerance, int32_t refinements);
 
 // The pseudo-inverse, n by m, by the singular values above the tolerance, which is absolute; below
 // 0 it is max(m, n) times the largest one times the machine epsilon. It may take the place of a.
 //
 // ErrNonFiniteInput, ErrOutOfMemory, ErrIterationLimit.
 template <ElementType E>
-ErrorCode PseudoInverseMatrix(ConstMatrixView<E> a, double tolerance, MatrixView<E> out);
+ErrorCode PseudoInverseMatrix(const ConstMatrixView<E> &a, double tolerance,
+                              const MatrixView<E> &out);
 
 } // namespace qx
 

@@ -18,7 +18,7 @@ class Factorisation {
     typedef typename Element<E>::type T;
 
 public:
-    Factorisation(MatrixView<E> a, IndexVector pivots)
+    Factorisation(const MatrixView<E> &a, IndexVector pivots)
         : a_(a), m_(a.rows()), n_(a.cols()), pivots_(pivots) {}
 
     ErrorCode run(int32_t *parity) {
@@ -126,7 +126,7 @@ private:
 };
 
 template <ElementType E>
-void Exchange(MatrixView<E> x, ConstIndexVector pivots) {
+void Exchange(const MatrixView<E> &x, ConstIndexVector pivots) {
     typedef ElementOf<E> T;
     for (int32_t k = 0; k < x.rows(); ++k) {
         const int32_t p = pivots[k];
@@ -143,7 +143,7 @@ void Exchange(MatrixView<E> x, ConstIndexVector pivots) {
 // The factors of a copy of a matrix.
 template <ElementType E>
 struct FactoredCopy {
-    ErrorCode make(ConstMatrixView<E> a) {
+    ErrorCode make(const ConstMatrixView<E> &a) {
         if (const ErrorCode failed =
                 memory.take(Sized(lu, a.rows(), a.rows()), Sized(pivots, a.rows())))
             return failed;
@@ -158,7 +158,7 @@ struct FactoredCopy {
 
 // All columns of the unit matrix are solved for at once.
 template <ElementType E>
-ErrorCode Invert(ConstMatrixView<E> lu, ConstIndexVector pivots, MatrixView<E> out) {
+ErrorCode Invert(const ConstMatrixView<E> &lu, ConstIndexVector pivots, const MatrixView<E> &out) {
     SetIdentity<E>(out);
     return LUSolve<E>(lu, pivots, out, out);
 }
@@ -166,14 +166,14 @@ ErrorCode Invert(ConstMatrixView<E> lu, ConstIndexVector pivots, MatrixView<E> o
 } // namespace
 
 template <ElementType E>
-ErrorCode LUDecompose(MatrixView<E> a, IndexVector pivots, int32_t *parity) {
+ErrorCode LUDecompose(const MatrixView<E> &a, IndexVector pivots, int32_t *parity) {
     QX_EXPECTS(pivots.size() == a.rows());
     return Factorisation<E>(a, pivots).run(parity);
 }
 
 template <ElementType E>
-ErrorCode LUSolve(ConstMatrixView<E> lu, ConstIndexVector pivots, ConstMatrixView<E> b,
-                  MatrixView<E> x) {
+ErrorCode LUSolve(const ConstMatrixView<E> &lu, ConstIndexVector pivots,
+                  const ConstMatrixView<E> &b, const MatrixView<E> &x) {
     QX_EXPECTS(lu.isSquare() && pivots.size() == lu.rows() && b.rows() == lu.rows() &&
                x.rows() == b.rows() && x.cols() == b.cols());
     for (const int32_t pivot : pivots)
@@ -186,7 +186,7 @@ ErrorCode LUSolve(ConstMatrixView<E> lu, ConstIndexVector pivots, ConstMatrixVie
 }
 
 template <ElementType E>
-ErrorCode SolveByLU(ConstMatrixView<E> a, ConstVectorView<E> b, VectorView<E> x) {
+ErrorCode SolveByLU(const ConstMatrixView<E> &a, ConstVectorView<E> b, VectorView<E> x) {
     FactoredCopy<E> factored;
     if (const ErrorCode failed = factored.make(a))
         return failed;
@@ -194,7 +194,7 @@ ErrorCode SolveByLU(ConstMatrixView<E> a, ConstVectorView<E> b, VectorView<E> x)
 }
 
 template <ElementType E>
-ErrorCode InvertByLU(ConstMatrixView<E> a, MatrixView<E> out) {
+ErrorCode InvertByLU(const ConstMatrixView<E> &a, const MatrixView<E> &out) {
     FactoredCopy<E> factored;
     if (const ErrorCode failed = factored.make(a))
         return failed;
@@ -202,7 +202,7 @@ ErrorCode InvertByLU(ConstMatrixView<E> a, MatrixView<E> out) {
 }
 
 template <ElementType E>
-ErrorCode InvertFactors(MatrixView<E> lu, ConstIndexVector pivots) {
+ErrorCode InvertFactors(const MatrixView<E> &lu, ConstIndexVector pivots) {
     MatrixView<E> copy;
     ScratchParts memory;
     if (const ErrorCode failed = memory.take(Sized(copy, lu.rows(), lu.rows())))
@@ -211,15 +211,17 @@ ErrorCode InvertFactors(MatrixView<E> lu, ConstIndexVector pivots) {
     return Invert<E>(copy, pivots, lu);
 }
 
-template ErrorCode LUDecompose(RealMatrix, IndexVector, int32_t *);
-template ErrorCode LUDecompose(ComplexMatrix, IndexVector, int32_t *);
-template ErrorCode LUSolve(ConstRealMatrix, ConstIndexVector, ConstRealMatrix, RealMatrix);
-template ErrorCode LUSolve(ConstComplexMatrix, ConstIndexVector, ConstComplexMatrix, ComplexMatrix);
-template ErrorCode SolveByLU(ConstRealMatrix, ConstRealVector, RealVector);
-template ErrorCode SolveByLU(ConstComplexMatrix, ConstComplexVector, ComplexVector);
-template ErrorCode InvertByLU(ConstRealMatrix, RealMatrix);
-template ErrorCode InvertByLU(ConstComplexMatrix, ComplexMatrix);
-template ErrorCode InvertFactors(RealMatrix, ConstIndexVector);
-template ErrorCode InvertFactors(ComplexMatrix, ConstIndexVector);
+template ErrorCode LUDecompose(const RealMatrix &, IndexVector, int32_t *);
+template ErrorCode LUDecompose(const ComplexMatrix &, IndexVector, int32_t *);
+template ErrorCode LUSolve(const ConstRealMatrix &, ConstIndexVector, const ConstRealMatrix &,
+                           const RealMatrix &);
+template ErrorCode LUSolve(const ConstComplexMatrix &, ConstIndexVector, const ConstComplexMatrix &,
+                           const ComplexMatrix &);
+template ErrorCode SolveByLU(const ConstRealMatrix &, ConstRealVector, RealVector);
+template ErrorCode SolveByLU(const ConstComplexMatrix &, ConstComplexVector, ComplexVector);
+template ErrorCode InvertByLU(const ConstRealMatrix &, const RealMatrix &);
+template ErrorCode InvertByLU(const ConstComplexMatrix &, const ComplexMatrix &);
+template ErrorCode InvertFactors(const RealMatrix &, ConstIndexVector);
+template ErrorCode InvertFactors(const ComplexMatrix &, ConstIndexVector);
 
 } // namespace qx

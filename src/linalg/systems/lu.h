@@ -14,25 +14,25 @@ namespace qx {
 //
 // WarnSingular where a column has no pivot other than 0; the factors are complete all the same.
 template <ElementType E>
-ErrorCode LUDecompose(MatrixView<E> a, IndexVector pivots, int32_t *parity);
+ErrorCode LUDecompose(const MatrixView<E> &a, IndexVector pivots, int32_t *parity);
 
 // Solves with the factors of a square matrix; x may be b.
 // ErrIndexOutOfRange (a pivot is no row of the matrix), ErrOutOfMemory.
 template <ElementType E>
-ErrorCode LUSolve(ConstMatrixView<E> lu, ConstIndexVector pivots, ConstMatrixView<E> b,
-                  MatrixView<E> x);
+ErrorCode LUSolve(const ConstMatrixView<E> &lu, ConstIndexVector pivots,
+                  const ConstMatrixView<E> &b, const MatrixView<E> &x);
 
 // a x = b for a square a; the inputs stay. ErrOutOfMemory, ErrSingularMatrix.
 template <ElementType E>
-ErrorCode SolveByLU(ConstMatrixView<E> a, ConstVectorView<E> b, VectorView<E> x);
+ErrorCode SolveByLU(const ConstMatrixView<E> &a, ConstVectorView<E> b, VectorView<E> x);
 
 // The inverse; out may be a. ErrOutOfMemory, ErrSingularMatrix.
 template <ElementType E>
-ErrorCode InvertByLU(ConstMatrixView<E> a, MatrixView<E> out);
+ErrorCode InvertByLU(const ConstMatrixView<E> &a, const MatrixView<E> &out);
 
 // The inverse from the factors, in their place. ErrIndexOutOfRange, ErrOutOfMemory.
 template <ElementType E>
-ErrorCode InvertFactors(MatrixView<E> lu, ConstIndexVector pivots);
+ErrorCode InvertFactors(const MatrixView<E> &lu, ConstIndexVector pivots);
 
 } // namespace qx
 

@@ -5,7 +5,7 @@
 namespace qx {
 
 template <ElementType E>
-ErrorCode Substitute(Factors factors, ConstVectorView<E> a, MatrixView<E> x) {
+ErrorCode Substitute(Factors factors, ConstVectorView<E> a, const MatrixView<E> &x) {
     const int32_t n = x.rows(), rightSides = x.cols();
     QX_EXPECTS(x.isWhole() &&
                a.size() == (factors == Factors::lu ? int64_t{n} * n : PackedLength(n)));
@@ -20,7 +20,7 @@ ErrorCode Substitute(Factors factors, ConstVectorView<E> a, MatrixView<E> x) {
     return 0;
 }
 
-template ErrorCode Substitute(Factors, ConstRealVector, RealMatrix);
-template ErrorCode Substitute(Factors, ConstComplexVector, ComplexMatrix);
+template ErrorCode Substitute(Factors, ConstRealVector, const RealMatrix &);
+template ErrorCode Substitute(Factors, ConstComplexVector, const ComplexMatrix &);
 
 } // namespace qx

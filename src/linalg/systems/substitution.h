@@ -23,7 +23,7 @@ enum class Factors {
 //   packed ones  each unknown's multiple is subtracted from all later elements at once
 // No pivot is tested. ErrOutOfMemory, for more than one right side.
 template <ElementType E>
-ErrorCode Substitute(Factors factors, ConstVectorView<E> a, MatrixView<E> x);
+ErrorCode Substitute(Factors factors, ConstVectorView<E> a, const MatrixView<E> &x);
 
 // The same with memory for the strips of columns that pass through the substitution together: n
 // times `stripWidth` doubles, or none for a single right side.

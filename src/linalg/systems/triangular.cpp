@@ -26,7 +26,7 @@ bool HasSmallPivot(ConstVectorView<E> packed, int32_t n, Triangle triangle) {
 } // namespace
 
 template <ElementType E>
-ErrorCode SolveTriangular(ConstVectorView<E> packed, Triangle triangle, MatrixView<E> x) {
+ErrorCode SolveTriangular(ConstVectorView<E> packed, Triangle triangle, const MatrixView<E> &x) {
     QX_EXPECTS(packed.size() == PackedLength(x.rows()));
     QX_EXPECTS(triangle == lowerTriangle || triangle == upperTriangle);
     if (!AllFinite<E>(packed) || !AllFinite<E>(x))
@@ -38,8 +38,8 @@ ErrorCode SolveTriangular(ConstVectorView<E> packed, Triangle triangle, MatrixVi
 }
 
 template <ElementType E>
-ErrorCode CholeskySolve(ConstMatrixView<E> a, Triangle read, ConstMatrixView<E> b,
-                        MatrixView<E> x) {
+ErrorCode CholeskySolve(const ConstMatrixView<E> &a, Triangle read, const ConstMatrixView<E> &b,
+                        const MatrixView<E> &x) {
     const int32_t n = a.rows();
     QX_EXPECTS(a.isSquare() && b.rows() == n && x.rows() == n && x.cols() == b.cols());
     if (!AllFinite<E>(a) || !AllFinite<E>(b))
@@ -63,9 +63,11 @@ ErrorCode CholeskySolve(ConstMatrixView<E> a, Triangle read, ConstMatrixView<E> 
     return Substitute<E>(Factors::cholesky, packed, x);
 }
 
-template ErrorCode SolveTriangular(ConstRealVector, Triangle, RealMatrix);
-template ErrorCode SolveTriangular(ConstComplexVector, Triangle, ComplexMatrix);
-template ErrorCode CholeskySolve(ConstRealMatrix, Triangle, ConstRealMatrix, RealMatrix);
-template ErrorCode CholeskySolve(ConstComplexMatrix, Triangle, ConstComplexMatrix, ComplexMatrix);
+template ErrorCode SolveTriangular(ConstRealVector, Triangle, const RealMatrix &);
+template ErrorCode SolveTriangular(ConstComplexVector, Triangle, const ComplexMatrix &);
+template ErrorCode CholeskySolve(const ConstRealMatrix &, Triangle, const ConstRealMatrix &,
+                                 const RealMatrix &);
+template ErrorCode CholeskySolve(const ConstComplexMatrix &, Triangle, const ConstComplexMatrix &,
+                                 const ComplexMatrix &);
 
 } // namespace qx

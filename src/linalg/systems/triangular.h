@@ -11,13 +11,14 @@ namespace qx {
 // ErrNonFiniteInput; ErrSingularMatrix where the modulus of a diagonal element is not above the
 // machine epsilon times the largest modulus of the triangle; ErrOutOfMemory.
 template <ElementType E>
-ErrorCode SolveTriangular(ConstVectorView<E> packed, Triangle triangle, MatrixView<E> x);
+ErrorCode SolveTriangular(ConstVectorView<E> packed, Triangle triangle, const MatrixView<E> &x);
 
 // a x = b for a positive definite a, of which one triangle is read: lowerTriangle or upperTriangle.
 //
 // ErrNonFiniteInput, ErrOutOfMemory, ErrNotPositiveDefinite.
 template <ElementType E>
-ErrorCode CholeskySolve(ConstMatrixView<E> a, Triangle read, ConstMatrixView<E> b, MatrixView<E> x);
+ErrorCode CholeskySolve(const ConstMatrixView<E> &a, Triangle read, const ConstMatrixView<E> &b,
+                        const MatrixView<E> &x);
 
 } // namespace qx
 
