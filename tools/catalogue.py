@@ -18,6 +18,11 @@ code stands by its name, in the order in which it is raised, with the reason in 
     WarnSingular (a pivot is 0). A sentence that belongs to it no more.
     Codes: none.
 
+What a NaN does in an input that may have one stands in the sentence "NaN:", by arguments and fields of
+records, in these words; tests/codes holds the recipes of the export to it:
+
+    NaN: x, w refused with ErrNonFiniteInput; y in all results; z.count in some results or in no result.
+
 Which values an argument takes that chooses among few stands in a sentence that begins with its name
 and a colon, or in an indented table behind such a colon. The values ascend in a sentence, with a
 semicolon between them; a range has one text:
@@ -30,7 +35,7 @@ In the introduction of a header it holds for all exports there that have such an
 without a text has that of the introduction.
 
 A comment that begins "As NAME, ..." or "As NAME." takes over the text of that export, and its
-codes where it has no such sentence of its own.
+codes and what it says of NaN where it has no such sentence of its own.
 """
 
 import argparse
@@ -351,6 +356,24 @@ def raised_by(documentation):
     return items
 
 
+NAN_WORD = re.compile(r"refused with (Err\w+)|in (?:all results|some results|no result)")
+
+
+def nan_of(documentation):
+    """What the sentence "NaN:" says: places and their words; None where there is no such sentence."""
+    match = re.search(r"(?:^|\.\s+)NaN: ((?:[^.]|\.(?=\w))*)\.(?:\s|$)", documentation)
+    if not match:
+        return None
+    found = {}
+    for item in " ".join(match[1].split()).split("; "):
+        parts = re.fullmatch(r"([\w.]+(?:, [\w.]+)*) ((?:refused|in) .+)", item)
+        words = parts[2].split(" or ") if parts else []
+        if not parts or not all(NAN_WORD.fullmatch(word) for word in words):
+            raise ValueError(f"'{item}' under 'NaN:' is not places with what becomes of a NaN there")
+        found.update((place, words) for place in parts[1].split(", "))
+    return found
+
+
 FULL_STOP = re.compile(r"(?<!\.)\.(?= |$)")  # not the dots of "x[1], x[2] ... x[n]"
 VALUE = re.compile(r"(\d+)(?: to (\d+))?(?:\s+(\S.*))?", re.DOTALL)
 
@@ -462,6 +485,14 @@ def resolve(export, by_name, path=()):
     if export["hasStatus"] and not (codes or export["hostStatus"] or export["saysNone"]):
         raise ValueError("has a status, but its documentation has no sentence 'Codes: ...'")
     export.pop("saysNone")
+    names = {a["name"] for a in export["arguments"]}
+    own = export["nan"]
+    for place in own or {}:
+        if place.split(".")[0] not in names:
+            raise ValueError(f"says of {place} what a NaN does there, which is no argument")
+    if own is None:
+        inherited = like["nan"] if like else {}
+        export["nan"] = {p: words for p, words in inherited.items() if p.split(".")[0] in names}
 
 
 def export_of(path, statement, types, codes):
@@ -488,6 +519,7 @@ def export_of(path, statement, types, codes):
         fail(f"{name}: the documentation {unknown}")
     try:
         raised = raised_by(documentation)
+        nan = nan_of(documentation)
     except ValueError as error:
         fail(f"{name}: {error}")
 
@@ -515,7 +547,7 @@ def export_of(path, statement, types, codes):
             a["kind"] == "error" or a.get("element") == "WorkspaceStatus" for a in arguments),
         # What resolve() makes an end of.
         "as": like[1] if (like := re.match(r"As (\w+)[,.]", documentation)) else None,
-        "raised": raised, "saysNone": raised == [],
+        "raised": raised, "saysNone": raised == [], "nan": nan,
     }
 
 

@@ -12,24 +12,7 @@ using std::ptrdiff_t;
 typedef Lanes<nativeLanes> Wide;
 constexpr int complexes = nativeLanes / 2; // values in one Wide
 
-// Complex values in the opposite order.
-QX_INLINE Wide ReversedComplex(Wide x) {
-#ifdef __AVX2__
-    return Wide(__builtin_shufflevector(x.v, x.v, 2, 3, 0, 1));
-#else
-    return x;
-#endif
-}
-
-QX_INLINE Wide Conjugate(Wide x) {
-    typedef int64_t Bits __attribute__((vector_size(sizeof(Wide))));
-#ifdef __AVX2__
-    const Bits sign = {0, INT64_MIN, 0, INT64_MIN};
-#else
-    const Bits sign = {0, INT64_MIN};
-#endif
-    return Wide((Wide::Vector)((Bits)x.v ^ sign));
-}
+QX_INLINE Wide Conjugate(Wide x) { return NegatedInPairs(x, false); }
 
 struct AsItIs {
     template <class L>
@@ -84,8 +67,8 @@ void ScaleReversed(DBL *values, double scale, int32_t n) {
     for (; high - low >= 2 * nativeLanes; low += nativeLanes, high -= nativeLanes) {
         const Wide a = Wide::load(low) * Wide(scale);
         const Wide b = Wide::load(high - nativeLanes) * Wide(scale);
-        ReversedComplex(b).store(low);
-        ReversedComplex(a).store(high - nativeLanes);
+        ReversedPairs(b).store(low);
+        ReversedPairs(a).store(high - nativeLanes);
     }
     for (; high - low >= 2; low += 2, high -= 2) { // they may be the same value at last
         const Lanes<2> a = Lanes<2>::load(low) * Lanes<2>(scale);
@@ -112,7 +95,7 @@ void JoinMirrored(const DBL *up, const DBL *down, DBL *complex, int32_t count) {
 void ConjugateBackward(const DBL *from, DBL *to, int32_t count) {
     ptrdiff_t k = 0;
     for (; k + complexes <= count; k += complexes)
-        ReversedComplex(Conjugate(Wide::load(from + 2 * k))).store(to - 2 * (k + complexes - 1));
+        ReversedPairs(Conjugate(Wide::load(from + 2 * k))).store(to - 2 * (k + complexes - 1));
     for (; k < count; ++k) {
         to[-2 * k] = from[2 * k];
         to[-2 * k + 1] = -from[2 * k + 1];

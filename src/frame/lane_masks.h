@@ -4,23 +4,11 @@
 #include "frame/lanes.h"
 
 #include <cstdint>
-#include <immintrin.h>
 
 namespace qx {
 
 // Comparisons of lanes, choices by them, the bits of numbers, and lanes moved by one, for Lanes<2>
 // and Lanes<4>.
-
-template <int N>
-struct LaneInteger;
-template <>
-struct LaneInteger<2> {
-    typedef int64_t type __attribute__((vector_size(16)));
-};
-template <>
-struct LaneInteger<4> {
-    typedef int64_t type __attribute__((vector_size(32)));
-};
 
 template <class L>
 using BitsOf = typename LaneInteger<L::count>::type;
@@ -69,6 +57,14 @@ template <int N>
 QX_INLINE LaneMask<Lanes<N>> operator==(Lanes<N> a, Lanes<N> b) {
     return {(BitsOf<Lanes<N>>)(a.v == b.v)};
 }
+template <int N>
+QX_INLINE LaneMask<Lanes<N>> operator>(Lanes<N> a, Lanes<N> b) {
+    return {(BitsOf<Lanes<N>>)(a.v > b.v)};
+}
+template <int N>
+QX_INLINE LaneMask<Lanes<N>> operator>=(Lanes<N> a, Lanes<N> b) {
+    return {(BitsOf<Lanes<N>>)(a.v >= b.v)};
+}
 template <class L>
 QX_INLINE LaneMask<L> operator&(LaneMask<L> a, LaneMask<L> b) {
     return {a.m & b.m};
@@ -85,17 +81,14 @@ template <class L>
 QX_INLINE L Select(LaneMask<L> where, L a, L b) {
     return L(where.m ? a.v : b.v);
 }
+// One bit for each lane, that of lane 0 lowest.
+template <class L>
+QX_INLINE unsigned MaskBits(LaneMask<L> a) {
+    return SignBits(OfBits<L>(a.m));
+}
 template <class L>
 QX_INLINE bool Any(LaneMask<L> a) {
-    if constexpr (L::count == 2)
-        return _mm_movemask_pd((__m128d)a.m) != 0;
-#ifdef __AVX2__
-    else
-        return _mm256_movemask_pd((__m256d)a.m) != 0;
-#else
-    else
-        return (a.m[0] | a.m[1] | a.m[2] | a.m[3]) != 0;
-#endif
+    return MaskBits(a) != 0;
 }
 
 // The lanes moved up by one, with the last lane of `before` in the first.

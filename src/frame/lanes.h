@@ -5,6 +5,7 @@
 #include "qx/types.h"
 
 #include <cstddef>
+#include <cstdint>
 
 // Operations become part of the loop that uses them, at every level of optimisation.
 #define QX_INLINE __attribute__((always_inline)) inline
@@ -21,7 +22,8 @@ namespace qx {
 //     for (; i + nativeLanes <= n; i += nativeLanes) ScaleSome<Lanes<nativeLanes>>(x + i, f);
 //     for (; i < n; ++i) ScaleSome<Lanes<1>>(x + i, f);
 //
-// Memory need not be aligned. N is 1, 2 or 4.
+// Memory need not be aligned. N is 1, 2 or 4. What depends on the instruction set is here and
+// nowhere else; comparisons and choices are in frame/lane_masks.h.
 
 // What the instruction set of the build offers. Each build has its own of all that follows, so that
 // none of it can stand in for that of another.
@@ -46,6 +48,17 @@ struct LaneVector<4> {
     typedef double type __attribute__((vector_size(32)));
     typedef double inMemory __attribute__((vector_size(32), aligned(1), may_alias));
     static QX_INLINE type broadcast(double x) { return type{x, x, x, x}; }
+};
+
+template <int N>
+struct LaneInteger;
+template <>
+struct LaneInteger<2> {
+    typedef int64_t type __attribute__((vector_size(16)));
+};
+template <>
+struct LaneInteger<4> {
+    typedef int64_t type __attribute__((vector_size(32)));
 };
 
 template <int N>
@@ -116,6 +129,21 @@ public:
             return Lanes(__builtin_shufflevector(a.v, b.v, 2, 6, 3, 7));
     }
 
+    // a and b interleaved pair by pair: with lanes numbered from 0, the low half is a0 b0 (a2 b2),
+    // the high half a1 b1 (a3 b3). The same operations take the pairs apart again.
+    friend QX_INLINE Lanes PairsLow(Lanes a, Lanes b) {
+        if constexpr (N == 2)
+            return Lanes(__builtin_shufflevector(a.v, b.v, 0, 2));
+        else
+            return Lanes(__builtin_shufflevector(a.v, b.v, 0, 4, 2, 6));
+    }
+    friend QX_INLINE Lanes PairsHigh(Lanes a, Lanes b) {
+        if constexpr (N == 2)
+            return Lanes(__builtin_shufflevector(a.v, b.v, 1, 3));
+        else
+            return Lanes(__builtin_shufflevector(a.v, b.v, 1, 5, 3, 7));
+    }
+
     QX_INLINE double operator[](int lane) const { return v[lane]; }
 
     friend QX_INLINE Lanes operator+(Lanes a, Lanes b) { return Lanes(a.v + b.v); }
@@ -150,6 +178,182 @@ public:
 
     double v;
 };
+
+// ---- Neighbouring lanes as pairs, such as the parts of complex values ----
+
+// The first and the second value of each pair, twice.
+template <int N>
+QX_INLINE Lanes<N> FirstsTwice(Lanes<N> x) {
+    if constexpr (N == 2)
+        return Lanes<N>(__builtin_shufflevector(x.v, x.v, 0, 0));
+    else
+        return Lanes<N>(__builtin_shufflevector(x.v, x.v, 0, 0, 2, 2));
+}
+template <int N>
+QX_INLINE Lanes<N> SecondsTwice(Lanes<N> x) {
+    if constexpr (N == 2)
+        return Lanes<N>(__builtin_shufflevector(x.v, x.v, 1, 1));
+    else
+        return Lanes<N>(__builtin_shufflevector(x.v, x.v, 1, 1, 3, 3));
+}
+// The values of each pair exchanged.
+template <int N>
+QX_INLINE Lanes<N> Swapped(Lanes<N> x) {
+    if constexpr (N == 2)
+        return x.reversed();
+    else
+        return Lanes<N>(__builtin_shufflevector(x.v, x.v, 1, 0, 3, 2));
+}
+// The pairs in the opposite order.
+template <int N>
+QX_INLINE Lanes<N> ReversedPairs(Lanes<N> x) {
+    if constexpr (N == 2)
+        return x;
+    else
+        return Lanes<N>(__builtin_shufflevector(x.v, x.v, 2, 3, 0, 1));
+}
+// One pair in the place of all.
+template <int N>
+QX_INLINE Lanes<N> InEveryPair(Lanes<2> x) {
+    if constexpr (N == 2)
+        return x;
+    else
+        return Lanes<N>(__builtin_shufflevector(x.v, x.v, 0, 1, 0, 1));
+}
+// The first values of all pairs, or the second ones, with the opposite sign.
+template <int N>
+QX_INLINE Lanes<N> NegatedInPairs(Lanes<N> x, bool first) {
+    const int64_t one = first ? INT64_MIN : 0, other = first ? 0 : INT64_MIN;
+    typedef typename LaneInteger<N>::type Bits;
+    Bits sign;
+    if constexpr (N == 2)
+        sign = Bits{one, other};
+    else
+        sign = Bits{one, other, one, other};
+    return Lanes<N>((typename Lanes<N>::Vector)((Bits)x.v ^ sign));
+}
+// a with the first values less those of b, the second ones plus those of b.
+QX_INLINE Lanes<2> MinusPlus(Lanes<2> a, Lanes<2> b) {
+#ifdef __SSE3__
+    return Lanes<2>(__builtin_shufflevector((a - b).v, (a + b).v, 0, 3));
+#else
+    return a + NegatedInPairs(b, true);
+#endif
+}
+QX_INLINE Lanes<4> MinusPlus(Lanes<4> a, Lanes<4> b) {
+    return Lanes<4>(__builtin_shufflevector((a - b).v, (a + b).v, 0, 5, 2, 7));
+}
+
+// Pairs from N / 2 places, and back.
+template <int N>
+QX_INLINE Lanes<N> LoadPairs(const DBL *const *from, std::ptrdiff_t at) {
+    const Lanes<2> a = Lanes<2>::load(from[0] + at);
+    if constexpr (N == 2)
+        return a;
+    else
+        return Lanes<N>(__builtin_shufflevector(a.v, Lanes<2>::load(from[1] + at).v, 0, 1, 2, 3));
+}
+QX_INLINE void StorePairs(Lanes<2> pairs, DBL *const *to, std::ptrdiff_t at) {
+    pairs.store(to[0] + at);
+}
+QX_INLINE void StorePairs(Lanes<4> pairs, DBL *const *to, std::ptrdiff_t at) {
+    Lanes<2>(__builtin_shufflevector(pairs.v, pairs.v, 0, 1)).store(to[0] + at);
+#ifdef __AVX2__
+    // As a shuffle g++ makes it one across lanes and a store.
+    Lanes<2>(__builtin_ia32_vextractf128_pd256(pairs.v, 1)).store(to[1] + at);
+#else
+    Lanes<2>(__builtin_shufflevector(pairs.v, pairs.v, 2, 3)).store(to[1] + at);
+#endif
+}
+
+// ---- Other lanes ----
+
+// One value from each of N places.
+template <int N>
+QX_INLINE Lanes<N> LoadEach(const DBL *const *from, std::ptrdiff_t at) {
+    if constexpr (N == 2)
+        return Lanes<N>(typename Lanes<N>::Vector{from[0][at], from[1][at]});
+    else
+        return Lanes<N>(
+            typename Lanes<N>::Vector{from[0][at], from[1][at], from[2][at], from[3][at]});
+}
+
+// The sign bits of the lanes, that of lane 0 lowest.
+QX_INLINE unsigned SignBits(Lanes<2> x) {
+    return static_cast<unsigned>(__builtin_ia32_movmskpd(x.v));
+}
+QX_INLINE unsigned SignBits(Lanes<4> x) {
+#ifdef __AVX2__
+    return static_cast<unsigned>(__builtin_ia32_movmskpd256(x.v));
+#else
+    return SignBits(Lanes<2>(__builtin_shufflevector(x.v, x.v, 0, 1))) |
+           SignBits(Lanes<2>(__builtin_shufflevector(x.v, x.v, 2, 3))) << 2;
+#endif
+}
+
+// N floats: the few operations that sums of products need. N is 1, 4 or 8.
+template <int N>
+struct FloatLaneVector;
+template <>
+struct FloatLaneVector<4> {
+    typedef float type __attribute__((vector_size(16)));
+    typedef float inMemory __attribute__((vector_size(16), aligned(1), may_alias));
+    static QX_INLINE type broadcast(float x) { return type{x, x, x, x}; }
+};
+template <>
+struct FloatLaneVector<8> {
+    typedef float type __attribute__((vector_size(32)));
+    typedef float inMemory __attribute__((vector_size(32), aligned(1), may_alias));
+    static QX_INLINE type broadcast(float x) { return type{x, x, x, x, x, x, x, x}; }
+};
+
+template <int N>
+class FloatLanes {
+public:
+    typedef typename FloatLaneVector<N>::type Vector;
+    static constexpr int count = N;
+
+    QX_INLINE FloatLanes() = default;
+    QX_INLINE explicit FloatLanes(float value) : v(FloatLaneVector<N>::broadcast(value)) {}
+    QX_INLINE explicit FloatLanes(Vector vector) : v(vector) {}
+    static QX_INLINE FloatLanes load(const SGL *x) {
+        return FloatLanes(
+            Vector(*reinterpret_cast<const typename FloatLaneVector<N>::inMemory *>(x)));
+    }
+    QX_INLINE void store(SGL *x) const {
+        *reinterpret_cast<typename FloatLaneVector<N>::inMemory *>(x) = v;
+    }
+
+    friend QX_INLINE FloatLanes operator+(FloatLanes a, FloatLanes b) {
+        return FloatLanes(a.v + b.v);
+    }
+    friend QX_INLINE FloatLanes operator*(FloatLanes a, FloatLanes b) {
+        return FloatLanes(a.v * b.v);
+    }
+
+    Vector v;
+};
+template <>
+class FloatLanes<1> {
+public:
+    static constexpr int count = 1;
+
+    QX_INLINE FloatLanes() = default;
+    QX_INLINE explicit FloatLanes(float value) : v(value) {}
+    static QX_INLINE FloatLanes load(const SGL *x) { return FloatLanes(*x); }
+    QX_INLINE void store(SGL *x) const { *x = v; }
+
+    friend QX_INLINE FloatLanes operator+(FloatLanes a, FloatLanes b) {
+        return FloatLanes(a.v + b.v);
+    }
+    friend QX_INLINE FloatLanes operator*(FloatLanes a, FloatLanes b) {
+        return FloatLanes(a.v * b.v);
+    }
+
+    float v;
+};
+// As many as a register of Lanes<nativeLanes> holds.
+constexpr int nativeFloatLanes = 2 * nativeLanes;
 
 } // inline namespace
 } // namespace qx

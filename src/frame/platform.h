@@ -23,13 +23,6 @@ private:
     void *handle_;
 };
 
-// A critical section in memory of the caller's.
-int32_t CriticalSectionSize();
-void CriticalSectionCreate(void *section);
-void CriticalSectionDestroy(void *section);
-void CriticalSectionEnter(void *section);
-void CriticalSectionLeave(void *section);
-
 // Never 0.
 uintptr_t CurrentThread();
 

@@ -32,14 +32,8 @@ Mutex::~Mutex() {
         pthread_mutex_destroy(AsMutex(handle_));
     std::free(handle_);
 }
-void Mutex::lock() { CriticalSectionEnter(handle_); }
-void Mutex::unlock() { CriticalSectionLeave(handle_); }
-
-int32_t CriticalSectionSize() { return sizeof(pthread_mutex_t); }
-void CriticalSectionCreate(void *section) { pthread_mutex_init(AsMutex(section), nullptr); }
-void CriticalSectionDestroy(void *section) { pthread_mutex_destroy(AsMutex(section)); }
-void CriticalSectionEnter(void *section) { pthread_mutex_lock(AsMutex(section)); }
-void CriticalSectionLeave(void *section) { pthread_mutex_unlock(AsMutex(section)); }
+void Mutex::lock() { pthread_mutex_lock(AsMutex(handle_)); }
+void Mutex::unlock() { pthread_mutex_unlock(AsMutex(handle_)); }
 
 uintptr_t CurrentThread() { return static_cast<uintptr_t>(pthread_self()); }
 

@@ -10,8 +10,6 @@ const char *const hostModuleNames[2] = {"qxrt.dll", "qxffrt.dll"};
 
 namespace {
 
-CRITICAL_SECTION *AsSection(void *section) { return static_cast<CRITICAL_SECTION *>(section); }
-
 constexpr UINT stopIconTaskModal = 8208;
 static_assert(stopIconTaskModal == (MB_ICONHAND | MB_TASKMODAL));
 
@@ -21,12 +19,6 @@ Mutex::Mutex() : handle_(CreateMutexA(nullptr, FALSE, nullptr)) {}
 Mutex::~Mutex() { CloseHandle(handle_); }
 void Mutex::lock() { WaitForSingleObject(handle_, INFINITE); }
 void Mutex::unlock() { ReleaseMutex(handle_); }
-
-int32_t CriticalSectionSize() { return sizeof(CRITICAL_SECTION); }
-void CriticalSectionCreate(void *section) { InitializeCriticalSection(AsSection(section)); }
-void CriticalSectionDestroy(void *section) { DeleteCriticalSection(AsSection(section)); }
-void CriticalSectionEnter(void *section) { EnterCriticalSection(AsSection(section)); }
-void CriticalSectionLeave(void *section) { LeaveCriticalSection(AsSection(section)); }
 
 uintptr_t CurrentThread() { return GetCurrentThreadId(); }
 

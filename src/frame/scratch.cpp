@@ -200,34 +200,6 @@ ErrorCode ScratchParts::takeBlock(int64_t bytes, void **block) {
     return 0;
 }
 
-ErrorCode ScratchParts::takeBlocks(const int64_t *bytes, void **places, std::size_t count) {
-    constexpr int64_t sharedUpTo = int64_t{1} << 20;
-    release();
-    int64_t total = 0;
-    for (std::size_t i = 0; i < count; ++i) {
-        if (bytes[i] < 0)
-            return ErrOutOfMemory;
-        total += (bytes[i] + 7) / 8 * 8;
-    }
-    if (total <= sharedUpTo) {
-        void *block;
-        if (const ErrorCode failed = takeBlock(total, &block))
-            return failed;
-        char *at = static_cast<char *>(block);
-        for (std::size_t i = 0; i < count; ++i) {
-            places[i] = at;
-            at += (bytes[i] + 7) / 8 * 8;
-        }
-        return 0;
-    }
-    for (std::size_t i = 0; i < count; ++i)
-        if (const ErrorCode failed = takeBlock(bytes[i], &places[i])) {
-            release();
-            return failed;
-        }
-    return 0;
-}
-
 ErrorCode ScratchParts::release() {
     ErrorCode status = 0;
     while (last_ != nullptr) {

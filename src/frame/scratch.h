@@ -157,17 +157,25 @@ public:
     ScratchParts() = default;
     ScratchParts(const ScratchParts &) = delete;
     ScratchParts &operator=(const ScratchParts &) = delete;
-    ~ScratchParts() { release(); }
+    ~ScratchParts() {
+        if (last_ != nullptr)
+            release();
+    }
 
     // ErrOutOfMemory, and then nothing is taken and no place is set.
     template <class... Places>
     ErrorCode take(const ScratchPart<Places> &...parts) {
-        const std::array<int64_t, sizeof...(parts)> bytes{parts.bytes...};
-        std::array<void *, sizeof...(parts)> places;
-        if (const ErrorCode failed = takeBlocks(bytes.data(), places.data(), sizeof...(parts)))
+        if (last_ != nullptr)
+            release();
+        if (((parts.bytes < 0) || ...))
+            return ErrOutOfMemory;
+        if ((wholeWords(parts.bytes) + ...) > sharedUpTo)
+            return takeApart(parts...);
+        void *block;
+        if (const ErrorCode failed = takeBlock((wholeWords(parts.bytes) + ...), &block))
             return failed;
-        std::size_t at = 0;
-        (parts.place(places[at++]), ...);
+        char *at = static_cast<char *>(block);
+        ((parts.place(at), at += wholeWords(parts.bytes)), ...);
         return 0;
     }
 
@@ -177,7 +185,21 @@ public:
 private:
     // Parts that fit into a mebibyte share a block; larger ones have a block each, so that they
     // need no more memory in one piece than the largest of them.
-    ErrorCode takeBlocks(const int64_t *bytes, void **places, std::size_t count);
+    static constexpr int64_t sharedUpTo = int64_t{1} << 20;
+    static int64_t wholeWords(int64_t bytes) { return (bytes + 7) / 8 * 8; }
+    template <class... Places>
+    ErrorCode takeApart(const ScratchPart<Places> &...parts) {
+        std::array<void *, sizeof...(parts)> places;
+        std::size_t at = 0;
+        if (!((takeBlock(parts.bytes, &places[at++]) == 0) && ...)) {
+            release();
+            return ErrOutOfMemory;
+        }
+        at = 0;
+        (parts.place(places[at++]), ...);
+        return 0;
+    }
+    // 0 or ErrOutOfMemory.
     ErrorCode takeBlock(int64_t bytes, void **block);
 
     void *last_ = nullptr; // each block starts with the address of the one before

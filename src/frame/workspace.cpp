@@ -73,39 +73,7 @@ int32_t SweepWorkspace(void *) {
     return 0;
 }
 
-// Guards the reading of the owner. Made before the process attach has chosen a heap, so the
-// memory comes straight from malloc.
-class OwnerLock {
-public:
-    OwnerLock() : section_(ScratchAllocPointer(platform::CriticalSectionSize())) {
-        platform::CriticalSectionCreate(section_);
-    }
-    ~OwnerLock() {
-        platform::CriticalSectionDestroy(section_);
-        ScratchFree(section_);
-    }
-    OwnerLock(const OwnerLock &) = delete;
-    OwnerLock &operator=(const OwnerLock &) = delete;
-    void enter() { platform::CriticalSectionEnter(section_); }
-    void leave() { platform::CriticalSectionLeave(section_); }
-
-private:
-    void *section_;
-};
-
-__attribute__((init_priority(200))) OwnerLock ownerLock;
-
 } // namespace
-
-ErrorCode AnalysisWorkspace::checkOwner() const {
-    // Without an owner there is nothing to guard, and the request stays free of locks.
-    if (ownerThread_.load(std::memory_order_relaxed) == 0)
-        return 0;
-    ownerLock.enter();
-    const uintptr_t owner = ownerThread_.load(std::memory_order_relaxed);
-    ownerLock.leave();
-    return owner == 0 || owner == platform::CurrentThread() ? 0 : ErrWorkspaceWrongThread;
-}
 
 int32_t AnalysisWorkspace::liveBlocks() const {
     const State now = unpack(state_.load(std::memory_order_acquire));
@@ -125,9 +93,6 @@ uint32_t AnalysisWorkspace::bump() const {
 
 ErrorCode AnalysisWorkspace::allocate(int64_t size, void **payload) {
     *payload = nullptr;
-    if (const ErrorCode status = checkOwner())
-        return status;
-
     const uint64_t total = static_cast<uint64_t>(size) + blockOverhead;
     const uintptr_t thread = platform::CurrentThread();
     noteThread(thread);

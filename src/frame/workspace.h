@@ -41,8 +41,7 @@ public:
 
     bool isEnabled() const { return enabled_.load(std::memory_order_relaxed); }
 
-    // A payload of `size` bytes: 0; with a null payload ErrWorkspaceWrongThread,
-    // ErrWorkspaceExhausted, or ErrWorkspaceNotInitialized where the region has just been given
+    // A payload of `size` bytes: 0; with a null payload ErrWorkspaceExhausted, or ErrWorkspaceNotInitialized where the region has just been given
     // back.
     ErrorCode allocate(int64_t size, void **payload);
     void release(void *payload);
@@ -87,7 +86,6 @@ private:
 
     enum class Phase { None, Changing, Ready };
 
-    ErrorCode checkOwner() const;
     void noteThread(uintptr_t thread);
     bool isFull(State now) const {
         return now.isFull && !servesMany_.load(std::memory_order_relaxed);
@@ -120,7 +118,6 @@ private:
     unsigned char *base_ = nullptr;
     std::atomic<Phase> phase_ = Phase::None;
     std::atomic<bool> enabled_ = false;
-    std::atomic<uintptr_t> ownerThread_ = 0; // nothing sets it
 };
 
 // The one workspace of the process.

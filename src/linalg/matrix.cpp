@@ -9,9 +9,8 @@ namespace {
 // kept: the lower bound is a truncated constant, so the last numbers above -DBL_MAX are refused.
 bool IsRefused(double x) { return !(x < 0x1.fffffffffffffp1023 && x > -1.7976931348623e308); }
 
-// Rows that fit into the first cache together, so that neither side is read or written in long
-// strides.
-constexpr int32_t rowsAtOnce = 16;
+// The sides of tiles that fit the first cache, whether rows or columns of the result come first.
+constexpr int32_t tile = 8;
 
 // Visits the packed elements in their order: at(i, j, packed element).
 template <class At>
@@ -35,21 +34,6 @@ ErrorCode CheckFinite(const DBL *x, int64_t n) {
 }
 
 template <ElementType E>
-bool AllFinite(ConstVectorView<E> x) {
-    return CheckFinite(reinterpret_cast<const DBL *>(x.data()), partsOf<E> * x.size()) == 0;
-}
-
-template <ElementType E>
-bool AllFinite(const ConstMatrixView<E> &a) {
-    if (a.isWhole())
-        return AllFinite<E>(a.elements());
-    for (int32_t i = 0; i < a.rows(); ++i)
-        if (!AllFinite<E>({a.row(i), a.cols()}))
-            return false;
-    return true;
-}
-
-template <ElementType E>
 void CopyMatrix(const ConstMatrixView<E> &from, const MatrixView<E> &to) {
     QX_EXPECTS(to.rows() == from.rows() && to.cols() == from.cols());
     for (int32_t i = 0; i < from.rows(); ++i)
@@ -59,12 +43,14 @@ void CopyMatrix(const ConstMatrixView<E> &from, const MatrixView<E> &to) {
 template <ElementType E>
 void CopyTransposed(const ConstMatrixView<E> &from, const MatrixView<E> &to) {
     QX_EXPECTS(to.rows() == from.cols() && to.cols() == from.rows());
-    for (int32_t top = 0; top < from.rows(); top += rowsAtOnce) {
-        const int32_t bottom = std::min(top + rowsAtOnce, from.rows());
-        for (int32_t j = 0; j < from.cols(); ++j)
+    for (int32_t top = 0; top < from.rows(); top += tile)
+        for (int32_t left = 0; left < from.cols(); left += tile) {
+            const int32_t bottom = std::min(top + tile, from.rows());
+            const int32_t right = std::min(left + tile, from.cols());
             for (int32_t i = top; i < bottom; ++i)
-                to(j, i) = from(i, j);
-    }
+                for (int32_t j = left; j < right; ++j)
+                    to(j, i) = from(i, j);
+        }
 }
 
 template <ElementType E>
@@ -104,10 +90,6 @@ void ExpandPacked(ConstVectorView<E> packed, Triangle triangle, const MatrixView
     });
 }
 
-template bool AllFinite(ConstRealVector);
-template bool AllFinite(ConstComplexVector);
-template bool AllFinite(const ConstRealMatrix &);
-template bool AllFinite(const ConstComplexMatrix &);
 template void CopyMatrix(const ConstRealMatrix &, const RealMatrix &);
 template void CopyMatrix(const ConstComplexMatrix &, const ComplexMatrix &);
 template void CopyTransposed(const ConstRealMatrix &, const RealMatrix &);

@@ -33,14 +33,22 @@ RealMatrix PartsOf(const MatrixView<E> &a) {
             a.stride() * partsOf<E>};
 }
 
-// Whether no element is NaN or infinite. The largest finite number is refused as well, and so is
-// whatever is not above -1.7976931348623e308.
-template <ElementType E>
-bool AllFinite(ConstVectorView<E> x);
-template <ElementType E>
-bool AllFinite(const ConstMatrixView<E> &a);
-// The same for n numbers: 0, or 1 where one is refused.
+// 0, or 1 where one of n numbers is NaN or infinite. The largest finite number is refused as well,
+// and so is whatever is not above -1.7976931348623e308.
 ErrorCode CheckFinite(const DBL *x, int64_t n);
+template <ElementType E>
+bool AllFinite(ConstVectorView<E> x) {
+    return CheckFinite(reinterpret_cast<const DBL *>(x.data()), partsOf<E> * x.size()) == 0;
+}
+template <ElementType E>
+bool AllFinite(const ConstMatrixView<E> &a) {
+    if (a.isWhole())
+        return AllFinite<E>(a.elements());
+    for (int32_t i = 0; i < a.rows(); ++i)
+        if (!AllFinite<E>(ConstVectorView<E>(a.row(i), a.cols())))
+            return false;
+    return true;
+}
 
 template <ElementType E>
 void CopyMatrix(const ConstMatrixView<E> &from, const MatrixView<E> &to);

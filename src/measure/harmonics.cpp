@@ -13,21 +13,19 @@ namespace {
 class SeenHarmonics {
 public:
     ErrorCode reserve(int32_t highest) {
-        if (const ErrorCode failed = lines_.allocate(highest * int64_t{sizeof(Line)}))
-            return failed;
-        return lineOf_.allocate(highest * int64_t{sizeof(I32)});
+        return memory_.take(Sized(lines_, highest), Sized(lineOf_, highest));
     }
     void lay(const Line &fundamental, int32_t n, int32_t highest);
 
     int32_t count() const { return count_; }
-    Line *lines() const { return static_cast<Line *>(lines_.bytes()); }
+    Line *lines() const { return lines_; }
     // The line of harmonic h + 1, or -1 where it cannot be told.
-    int32_t lineOf(int32_t h) const { return places()[h]; }
+    int32_t lineOf(int32_t h) const { return lineOf_[h]; }
 
 private:
-    I32 *places() const { return static_cast<I32 *>(lineOf_.bytes()); }
-
-    ScratchBytes lines_, lineOf_;
+    Line *lines_ = nullptr;
+    VectorView<ElementType::I32> lineOf_;
+    ScratchParts memory_;
     int32_t count_ = 0;
 };
 
@@ -35,12 +33,12 @@ void SeenHarmonics::lay(const Line &fundamental, int32_t n, int32_t highest) {
     const double halfBin = 0.5 / n;
     lines()[0] = fundamental;
     lines()[0].slope = 1;
-    places()[0] = 0;
+    lineOf_[0] = 0;
     count_ = 1;
     for (int32_t h = 1; h < highest; ++h) {
         const double turns = PartOfTurn(fundamental.frequency, h + 1.0);
         Line seen = {std::fabs(turns), 0, 0, turns < 0 ? -(h + 1.0) : h + 1.0};
-        places()[h] = -1;
+        lineOf_[h] = -1;
         if (seen.frequency < halfBin)
             continue;
         const bool isTold = seen.frequency <= 0.5 - halfBin;
@@ -53,12 +51,12 @@ void SeenHarmonics::lay(const Line &fundamental, int32_t n, int32_t highest) {
             ++same;
         if (same == count_) {
             lines()[count_] = seen;
-            places()[h] = isTold ? count_ : -1;
+            lineOf_[h] = isTold ? count_ : -1;
             ++count_;
         } else if (same > 0) {
             for (int32_t other = 1; other < h; ++other)
-                if (places()[other] == same)
-                    places()[other] = -1;
+                if (lineOf_[other] == same)
+                    lineOf_[other] = -1;
         }
     }
 }

@@ -1,6 +1,6 @@
 #include "measure/parabolas.h"
 
-#include "frame/lanes.h"
+#include "frame/lane_masks.h"
 
 namespace qx::QX_WIDTH {
 namespace {
@@ -9,25 +9,15 @@ typedef Lanes<nativeLanes> L;
 // Vectors of windows at once: enough independent sums to hide the time of an addition.
 constexpr int together = 8;
 
-// One bit for each lane of a comparison.
-template <class Mask>
-QX_INLINE uint64_t BitsOf(Mask mask) {
-#ifdef __AVX2__
-    return static_cast<uint64_t>(__builtin_ia32_movmskpd256(reinterpret_cast<L::Vector>(mask)));
-#else
-    return static_cast<uint64_t>(__builtin_ia32_movmskpd(reinterpret_cast<L::Vector>(mask)));
-#endif
-}
-
 QX_INLINE uint64_t RisingBits(L c1, L c2) {
-    const auto isSteep = c1.v > L(smallestSlope).v;
-    const auto isLevel = c1.v >= L(-smallestSlope).v;
-    return BitsOf(isSteep | (isLevel & (c2.v > L(0.0).v)));
+    const auto isSteep = c1 > L(smallestSlope);
+    const auto isLevel = c1 >= L(-smallestSlope);
+    return MaskBits(isSteep | (isLevel & (c2 > L(0.0))));
 }
 
 // c2 decides in no lane.
 QX_INLINE bool IsSlopeEnough(L c1) {
-    return BitsOf((c1.v >= L(-smallestSlope).v) & (c1.v <= L(smallestSlope).v)) == 0;
+    return !Any((c1 >= L(-smallestSlope)) & (c1 <= L(smallestSlope)));
 }
 
 // What is asked of the vertices of narrow windows. Within the reach the amplitude differs from c0
@@ -36,9 +26,9 @@ struct VertexTest {
     double reach, towards, level; // towards * amplitude > level
 
     QX_INLINE uint64_t bits(L c0, L c1, L c2) const {
-        const L slope(c1.v < L(0.0).v ? (-c1).v : c1.v);
+        const L slope = Select(c1 < L(0.0), -c1, c1);
         const L highest = L(towards) * c0 + slope;
-        return BitsOf((slope.v < (L(reach) * c2).v) & (highest.v > L(level).v));
+        return MaskBits((slope < L(reach) * c2) & (highest > L(level)));
     }
     QX_INLINE bool one(double c0, double c1, double c2) const {
         const double slope = c1 < 0 ? -c1 : c1;

@@ -1,6 +1,6 @@
 #include "measure/search.h"
 
-#include "frame/lanes.h"
+#include "frame/lane_masks.h"
 
 namespace qx::QX_WIDTH {
 namespace {
@@ -8,15 +8,6 @@ namespace {
 typedef Lanes<nativeLanes> L;
 constexpr int together = 4; // vectors that are looked at before a branch
 constexpr int32_t stride = together * nativeLanes;
-
-template <class Mask>
-QX_INLINE unsigned BitsOf(Mask mask) {
-#ifdef __AVX2__
-    return static_cast<unsigned>(__builtin_ia32_movmskpd256(reinterpret_cast<L::Vector>(mask)));
-#else
-    return static_cast<unsigned>(__builtin_ia32_movmskpd(reinterpret_cast<L::Vector>(mask)));
-#endif
-}
 
 // Each test once for a sample and once for those of a vector.
 struct Beyond {
@@ -26,7 +17,7 @@ struct Beyond {
     QX_INLINE bool one(int32_t i) const { return y[i] <= lower || y[i] >= upper; }
     QX_INLINE auto many(int32_t i) const {
         const L here = L::load(y + i);
-        return (here.v <= L(lower).v) | (here.v >= L(upper).v);
+        return (here <= L(lower)) | (here >= L(upper));
     }
 };
 
@@ -39,8 +30,7 @@ struct BeyondOrCrossing {
         return (here <= level && next >= level) || (here >= level && next <= level);
     }
     static QX_INLINE auto crosses(L here, L next, L level) {
-        return ((here.v <= level.v) & (next.v >= level.v)) |
-               ((here.v >= level.v) & (next.v <= level.v));
+        return ((here <= level) & (next >= level)) | ((here >= level) & (next <= level));
     }
     QX_INLINE bool one(int32_t i) const {
         bool found = beyond.one(i);
@@ -52,7 +42,7 @@ struct BeyondOrCrossing {
         const L here = L::load(beyond.y + i), next = L::load(beyond.y + i + 1);
         auto found = beyond.many(i);
         for (int k = 0; k < Levels; ++k)
-            found |= crosses(here, next, L(level[k]));
+            found = found | crosses(here, next, L(level[k]));
         return found;
     }
 };
@@ -62,17 +52,17 @@ QX_INLINE int32_t First(int32_t from, int32_t end, const Test &test) {
     // The next event of a lively waveform is near, so the first vectors are looked at one by one.
     int32_t i = from;
     for (int k = 0; k < together && end - i >= nativeLanes; ++k, i += nativeLanes)
-        if (const unsigned bits = BitsOf(test.many(i)))
+        if (const unsigned bits = MaskBits(test.many(i)))
             return i + __builtin_ctz(bits);
     for (; end - i >= stride; i += stride) {
         auto any = test.many(i);
         for (int k = 1; k < together; ++k)
-            any |= test.many(i + k * nativeLanes);
-        if (__builtin_expect(BitsOf(any) != 0, 0))
+            any = any | test.many(i + k * nativeLanes);
+        if (__builtin_expect(MaskBits(any) != 0, 0))
             break;
     }
     for (; end - i >= nativeLanes; i += nativeLanes)
-        if (const unsigned bits = BitsOf(test.many(i)))
+        if (const unsigned bits = MaskBits(test.many(i)))
             return i + __builtin_ctz(bits);
     for (; i < end; ++i)
         if (test.one(i))

@@ -108,31 +108,12 @@ ErrorCode SinusoidFit::reserve(int32_t lines) {
     const int64_t matrix = size * widest + size;
     const int64_t moments = 1 + momentsOfLine * count;
     const int64_t waves = 2 * waveBlock * count;
-    if (const ErrorCode failed = memory_.allocate(2 * waves + 2 * matrix + 3 * size + 2 * moments))
+    if (const ErrorCode failed = memory_.take(
+            Sized(waves_, waves), Sized(table_, waves), Sized(normal_, matrix),
+            Sized(factor_, matrix), Sized(gradient_, size), Sized(step_, size), Sized(scale_, size),
+            Sized(moments_, moments), Sized(trialMoments_, moments), Sized(trial_, count),
+            Sized(atBlock_, 4 * count), Sized(order_, count)))
         return failed;
-    if (const ErrorCode failed = phasors_.allocate(4 * count * int64_t{sizeof(Phasor)}))
-        return failed;
-    if (const ErrorCode failed = order_.allocate(count))
-        return failed;
-    if (const ErrorCode failed = trialMemory_.allocate(count * int64_t{sizeof(Line)}))
-        return failed;
-    DBL *next = memory_.data();
-    const auto part = [&next](int64_t length) {
-        DBL *const begin = next;
-        next += static_cast<std::ptrdiff_t>(length);
-        return begin;
-    };
-    waves_ = part(waves);
-    table_ = part(waves);
-    normal_ = part(matrix);
-    factor_ = part(matrix);
-    gradient_ = part(size);
-    step_ = part(size);
-    scale_ = part(size);
-    moments_ = part(moments);
-    trialMoments_ = part(moments);
-    trial_ = static_cast<Line *>(trialMemory_.bytes());
-    atBlock_ = static_cast<Phasor *>(phasors_.bytes());
     ofBlock_ = atBlock_ + lines;
     halfAngles_ = ofBlock_ + lines;
     return 0;

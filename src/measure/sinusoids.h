@@ -122,9 +122,8 @@ private:
     const DBL *samples_ = nullptr;
     int32_t n_ = 0;
     Layout layout_ = {};
-    Scratch<ElementType::DBL> memory_;
-    Scratch<ElementType::I32> order_; // the lines by rising frequency
-    ScratchBytes trialMemory_, phasors_;
+    ScratchParts memory_;
+    VectorView<ElementType::I32> order_; // the lines by rising frequency
     // By line: at the first sample of the block at hand, of a block, and two of half the angle of a
     // sample and of all.
     Phasor *atBlock_ = nullptr, *ofBlock_ = nullptr, *halfAngles_ = nullptr;

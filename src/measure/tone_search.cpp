@@ -89,12 +89,9 @@ ErrorCode ToneSearch::reserveSpectrum() {
         std::bit_ceil(static_cast<uint64_t>(std::max(fewest, 2 * int64_t{n_}))));
     if (length > std::numeric_limits<int32_t>::max() / int64_t{sizeof(DBL)})
         return ErrOutOfMemory;
-    for (Scratch<ElementType::DBL> *memory : {&residual_, &window_})
-        if (const ErrorCode failed = memory->allocate(n_))
-            return failed;
-    for (Scratch<ElementType::DBL> *memory : {&work_, &spectrum_})
-        if (const ErrorCode failed = memory->allocate(length))
-            return failed;
+    if (const ErrorCode failed = memory_.take(Sized(residual_, n_), Sized(window_, n_),
+                                              Sized(work_, length), Sized(spectrum_, length)))
+        return failed;
     plan_.emplace(static_cast<int32_t>(length));
     if (!*plan_)
         return ErrOutOfMemory;

@@ -81,9 +81,11 @@ private:
 
     int32_t n_ = 0;
     double unit_ = 1, level_ = 0;
-    Scratch<ElementType::DBL> samples_, residual_, window_;
+    Scratch<ElementType::DBL> samples_;
+    RealVector residual_, window_;
     int32_t spectrumLength_ = 0;
-    Scratch<ElementType::DBL> work_, spectrum_;
+    RealVector work_, spectrum_;
+    ScratchParts memory_;
     SinusoidFit fit_;
     std::optional<PlanReference> plan_;
     ScratchBytes lineMemory_;

@@ -113,13 +113,10 @@ private:
             periods, std::max({shortestRow, samplesAtOnce / rows_, span_ / rhythm_.advance})));
         pitch_ = (span_ + rhythm_.advance - 1) / rhythm_.advance + paddedWidth(chunk_) / parts;
         const int32_t sums = rhythm_.period == 1 ? 0 : rowsAtOnce * paddedWidth(chunk_);
-        if (const ErrorCode failed = rowsMemory_.allocate(parts * rows_ * pitch_))
+        if (const ErrorCode failed = memory_.take(Sized(inRows_, parts * rows_ * pitch_),
+                                                  Sized(sums_, sums), Sized(offsets_, span_)))
             return failed;
-        if (const ErrorCode failed = sums_.allocate(sums))
-            return failed;
-        if (const ErrorCode failed = offsets_.allocate(span_))
-            return failed;
-        ClearSamples<SampleParts<Code>::real>(rowsMemory_.data(), parts * rows_ * pitch_);
+        ClearSamples<SampleParts<Code>::real>(inRows_.data(), parts * rows_ * pitch_);
         for (int64_t i = 0; i < span_; ++i)
             offsets_[i] =
                 static_cast<int32_t>(parts * (i % rhythm_.advance * pitch_ + i / rhythm_.advance));
@@ -138,7 +135,7 @@ private:
         const int64_t used = span_ + int64_t{periods - 1} * rhythm_.advance;
         for (int32_t r = 0; r < rows_; ++r)
             samples_.gather(base + r, rhythm_.advance, (used - r - 1) / rhythm_.advance + 1,
-                            reinterpret_cast<T *>(rowsMemory_.data()) + r * pitch_);
+                            reinterpret_cast<T *>(inRows_.data()) + r * pitch_);
     }
 
     Row rowOf(const OutputSum &output, Real *sums) const {
@@ -147,10 +144,10 @@ private:
     }
     void sum(const Row *rows, int32_t count, int32_t width) const {
         if constexpr (SampleParts<Code>::real == ElementType::DBL)
-            TapSumsDBL(rows, count, rhythm_.tapStep, rhythm_.sampleStep, rowsMemory_.data(), scale_,
+            TapSumsDBL(rows, count, rhythm_.tapStep, rhythm_.sampleStep, inRows_.data(), scale_,
                        width);
         else
-            TapSumsSGL(rows, count, rhythm_.tapStep, rhythm_.sampleStep, rowsMemory_.data(), scale_,
+            TapSumsSGL(rows, count, rhythm_.tapStep, rhythm_.sampleStep, inRows_.data(), scale_,
                        width);
     }
 
@@ -191,8 +188,9 @@ private:
     const Real scale_;
     int64_t lowest_ = 0, span_ = 0, pitch_ = 0;
     int32_t rows_ = 0, chunk_ = 0;
-    Scratch<SampleParts<Code>::real> rowsMemory_, sums_;
-    Scratch<ElementType::I32> offsets_;
+    VectorView<SampleParts<Code>::real> inRows_, sums_;
+    VectorView<ElementType::I32> offsets_;
+    ScratchParts memory_;
 };
 
 // Outputs `first` to `end` - 1 into y. Before `regular` they may lack terms that the rhythm

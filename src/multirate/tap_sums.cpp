@@ -1,36 +1,21 @@
 #include "multirate/tap_sums.h"
 
-#include <cstring>
+#include "frame/lanes.h"
 
 namespace qx::QX_WIDTH {
 
 namespace {
 
-#ifdef __AVX2__
-constexpr int vectorBytes = 32;
-#else
-constexpr int vectorBytes = 16;
-#endif
-
-// A vector of reals; every operation does in each lane what it would do to one number.
-template <class Real>
-struct Vector {
-    typedef Real type __attribute__((vector_size(vectorBytes)));
-    static constexpr int count = vectorBytes / sizeof(Real);
-    static type broadcast(Real v) {
-        if constexpr (count == 2)
-            return type{v, v};
-        else if constexpr (count == 4)
-            return type{v, v, v, v};
-        else
-            return type{v, v, v, v, v, v, v, v};
-    }
+// The lanes of an element's type.
+template <ElementType Code, int N>
+struct LanesOf {
+    typedef Lanes<N> type;
+    static constexpr int most = nativeLanes;
 };
-template <class Real>
-struct Single {
-    typedef Real type;
-    static constexpr int count = 1;
-    static type broadcast(Real value) { return value; }
+template <int N>
+struct LanesOf<ElementType::SGL, N> {
+    typedef FloatLanes<N> type;
+    static constexpr int most = nativeFloatLanes;
 };
 
 // Keyed by the element's code, since a template argument would drop the alignment of its type.
@@ -47,23 +32,24 @@ struct Problem {
     // Adds terms `first` to `end` - 1 of `Rows` rows to sums of `Parts` lanes each.
     template <int Rows, int Parts, class Lane>
     void addTerms(const TapRow<Code> *rows, int32_t at, int32_t first, int32_t end,
-                  typename Lane::type (*sum)[Parts]) const {
+                  Lane (*sum)[Parts]) const {
         for (int32_t j = first; j < end; ++j)
             for (int row = 0; row < Rows; ++row) {
-                const auto factor = Lane::broadcast(rows[row].taps[j * tapStep]);
+                const Lane factor(rows[row].taps[j * tapStep]);
                 const T *sample = samples + rows[row].offsets[j * offsetStep] + at;
-                for (int part = 0; part < Parts; ++part) {
-                    typename Lane::type value;
-                    std::memcpy(&value, sample + part * Lane::count, sizeof value);
-                    sum[row][part] = sum[row][part] + factor * value;
-                }
+                for (int part = 0; part < Parts; ++part)
+                    sum[row][part] =
+                        sum[row][part] + factor * Lane::load(sample + part * Lane::count);
             }
     }
 
     // Several chains of additions side by side hide the latency of each.
     template <int Rows, int Parts, class Lane>
     void sumAt(const TapRow<Code> *rows, int32_t at) const {
-        typename Lane::type sum[Rows][Parts] = {};
+        Lane sum[Rows][Parts];
+        for (auto &sums : sum)
+            for (Lane &part : sums)
+                part = Lane(0);
         int32_t common = rows[0].terms;
         for (int row = 1; row < Rows; ++row)
             if (rows[row].terms < common)
@@ -72,17 +58,15 @@ struct Problem {
         for (int row = 0; row < Rows; ++row) {
             if (Rows > 1)
                 addTerms<1, Parts, Lane>(rows + row, at, common, rows[row].terms, sum + row);
-            for (int part = 0; part < Parts; ++part) {
-                const auto scaled = Lane::broadcast(scale) * sum[row][part];
-                std::memcpy(rows[row].sums + at + part * Lane::count, &scaled, sizeof scaled);
-            }
+            for (int part = 0; part < Parts; ++part)
+                (Lane(scale) * sum[row][part]).store(rows[row].sums + at + part * Lane::count);
         }
     }
 
     template <int Rows>
     void sumRows(const TapRow<Code> *rows) const {
-        typedef Vector<Real> Wide;
-        typedef Single<Real> Narrow;
+        typedef typename LanesOf<Code, LanesOf<Code, 1>::most>::type Wide;
+        typedef typename LanesOf<Code, 1>::type Narrow;
         int32_t at = 0;
         for (; at + 8 * Wide::count <= width; at += 8 * Wide::count)
             for (int row = 0; row < Rows; ++row)

@@ -119,6 +119,121 @@ TEST_F(Codes, WithoutWitnessAreDocumentedAndNotRaised) {
     }
 }
 
+// ---- NaN ----
+
+// What the recipes of an export show of a NaN first, in the middle and last in each input, and in
+// each number: by places, in the order of the header's words.
+class NaNs {
+public:
+    explicit NaNs(const Interceptable &target) : target_(target) {}
+
+    void look(const Recipe &recipe) {
+        int32_t n = recipe.sizes.front(); // the largest size up to 8
+        for (const int32_t size : recipe.sizes)
+            n = size <= 8 ? std::max(n, size) : n;
+        const SpoiltRun as = RunSpoilt(recipe, n, {});
+        for (const SpoilPlace &place : as.places) {
+            if (!mayBeNaN(place))
+                continue;
+            int64_t count = 1;
+            for (const int32_t size : place.sizes)
+                count *= size;
+            for (const int64_t at : std::set<int64_t>{0, count / 2, count - 1}) {
+                const std::string action =
+                    place.dimensions == 0 ? "= nan" : "at " + std::to_string(at) + " nan";
+                const SpoiltRun run = RunSpoilt(recipe, n, {{place.name, action}});
+                if (run.applied)
+                    seen_[place.name].insert(outcome(as, run));
+            }
+        }
+    }
+
+    std::map<std::string, std::string> words() const {
+        std::map<std::string, std::string> found;
+        for (const auto &[place, outcomes] : seen_)
+            for (const auto &[order, word] : outcomes)
+                found[place] += (found[place].empty() ? "" : " or ") + word;
+        return found;
+    }
+
+private:
+    typedef std::pair<int, std::string> Outcome;
+
+    bool mayBeNaN(const SpoilPlace &place) const {
+        const std::string &e = place.element;
+        if (e != "DBL" && e != "SGL" && e != "CDB" && e != "CSG")
+            return false;
+        const std::string argument = place.name.substr(0, place.name.find('.'));
+        for (const InterceptedArgument &one : target_.arguments)
+            if (one.name == argument)
+                return !one.isOutput;
+        return false;
+    }
+    Outcome outcome(const SpoiltRun &as, const SpoiltRun &run) const {
+        for (const ErrorCode code : run.codes)
+            if (code < 0) {
+                const auto at = std::find(target_.codes.begin(), target_.codes.end(), code);
+                return {static_cast<int>(at - target_.codes.begin()),
+                        "refused with " + NameOf(code)};
+            }
+        const auto count = [](const SpoiltRun &of) {
+            return std::count_if(of.numbers.begin(), of.numbers.end(),
+                                 [](double number) { return number != number; });
+        };
+        const auto nans = count(run);
+        if (nans <= count(as))
+            return {1002, "in no result"};
+        return nans == static_cast<std::ptrdiff_t>(run.numbers.size())
+                   ? Outcome{1000, "in all results"}
+                   : Outcome{1001, "in some results"};
+    }
+
+    const Interceptable &target_;
+    std::map<std::string, std::set<Outcome>> seen_;
+};
+
+// The sentence as a header has it: places of the same words together.
+std::string SentenceOf(const Interceptable &target, std::map<std::string, std::string> words) {
+    std::string sentence;
+    for (const InterceptedArgument &argument : target.arguments)
+        for (auto first = words.begin(); first != words.end();) {
+            if (first->first.substr(0, first->first.find('.')) != argument.name) {
+                ++first;
+                continue;
+            }
+            const std::string word = first->second;
+            std::string places;
+            for (const InterceptedArgument &other : target.arguments)
+                for (auto at = words.begin(); at != words.end();)
+                    if (at->second == word &&
+                        at->first.substr(0, at->first.find('.')) == other.name) {
+                        places += (places.empty() ? "" : ", ") + at->first;
+                        at = words.erase(at);
+                    } else {
+                        ++at;
+                    }
+            sentence += (sentence.empty() ? "NaN: " : "; ") + places + " " + word;
+            first = words.begin();
+        }
+    return sentence + ".";
+}
+
+TEST(NaN, DoesInEachInputWhatItsHeaderSays) {
+    ASSERT_NE(BindExports(QX_MODULE), nullptr) << QX_MODULE;
+    std::map<std::string, std::vector<const Recipe *>> recipes;
+    for (const Recipe &recipe : AllRecipes())
+        recipes[recipe.exportName()].push_back(&recipe);
+    for (const Interceptable &target : AllInterceptable()) {
+        NaNs nans(target);
+        for (const Recipe *recipe : recipes[target.name])
+            nans.look(*recipe);
+        if (nans.words() != target.nan) {
+            ADD_FAILURE() << target.name << ": its recipes show \""
+                          << SentenceOf(target, nans.words()) << "\"";
+        }
+    }
+}
+
 } // namespace
 
 } // namespace qx::test

@@ -402,6 +402,19 @@ bool SpoiltRun::hasRaised(ErrorCode code) const {
     return std::find(codes.begin(), codes.end(), code) != codes.end();
 }
 
+namespace {
+std::vector<double> NumbersOf(const Call &call) {
+    std::vector<double> numbers;
+    for (const OutputValue &output : call.outputs()) {
+        const std::string part = PartOf(output.element);
+        if (part == "DBL" || part == "SGL")
+            for (std::size_t at = 0; at < output.bytes; at += PartSize(part))
+                numbers.push_back(Get(part, output.elements + at));
+    }
+    return numbers;
+}
+} // namespace
+
 SpoiltRun RunSpoilt(const Recipe &recipe, int32_t n, const Spoils &spoils) {
     Interception interception = {recipe.exportName(), &spoils, {}};
     active = &interception;
@@ -409,6 +422,7 @@ SpoiltRun RunSpoilt(const Recipe &recipe, int32_t n, const Spoils &spoils) {
         Call call(n);
         const Observed seen = Observe({}, 0x17, [&] { return recipe.run(call); });
         interception.run.applied &= seen.fault.empty();
+        interception.run.numbers = NumbersOf(call);
     }
     active = nullptr;
     return interception.run;

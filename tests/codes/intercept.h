@@ -33,6 +33,8 @@ struct Interceptable {
     std::vector<ErrorCode> checks; // as the documentation has them: some codes more than once
     bool hasInOrder(ErrorCode first, ErrorCode later) const;
     std::vector<InterceptedArgument> arguments;
+    std::map<std::string, std::string>
+        nan; // by arguments and "record.field"s, what a NaN there does
 };
 
 struct LayoutField {
@@ -98,6 +100,7 @@ struct SpoilPlace {
 struct SpoiltRun {
     std::vector<ErrorCode> codes;   // of its calls
     std::vector<SpoilPlace> places; // of the first call
+    std::vector<double> numbers;    // those of all outputs that may be NaN
     bool applied = true;            // whether each spoil had its place
     bool hasRaised(ErrorCode code) const;
 };

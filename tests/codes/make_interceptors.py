@@ -54,8 +54,10 @@ def row(e, place, codes):
     real_ = "nullptr" if "*" in e["returns"] else f"Real{place}"
     numbers = ", ".join(str(codes[c]) for c in e["codes"])
     checks = ", ".join(str(codes[c]) for c in e["checks"])
+    nan = ", ".join(f'{{"{place}", "{" or ".join(words)}"}}' for place, words in e["nan"].items())
     return (f'        {{"{e["name"]}", {real_}, {str(e["returns"] == "ErrorCode").lower()},\n'
-            f'         {{{numbers}}},\n         {{{checks}}},\n         {{\n{parameters}        }}}},\n')
+            f'         {{{numbers}}},\n         {{{checks}}},\n         {{\n{parameters}        }},\n'
+            f'         {{{nan}}}}},\n')
 
 
 def kind_of(a):

@@ -158,7 +158,7 @@ struct PackedTwiddledIn { // with a block of the lane table
 struct PackedGatherIn { // columns anywhere
     const DBL *x[packedColumns];
     ptrdiff_t leg;
-    QX_INLINE Wide at(int j) const { return LoadPairs(x, j * leg); }
+    QX_INLINE Wide at(int j) const { return LoadPairs<nativeLanes>(x, j * leg); }
 };
 
 struct PackedBlocksOut { // transform by transform
@@ -177,13 +177,7 @@ struct RealLanesIn { // neighbouring columns
 struct RealGatherIn { // columns anywhere
     const DBL *x[nativeLanes];
     ptrdiff_t leg;
-    QX_INLINE Wide at(int j) const {
-#ifdef __AVX2__
-        return Wide(Wide::Vector{x[0][j * leg], x[1][j * leg], x[2][j * leg], x[3][j * leg]});
-#else
-        return Wide(Wide::Vector{x[0][j * leg], x[1][j * leg]});
-#endif
-    }
+    QX_INLINE Wide at(int j) const { return LoadEach<nativeLanes>(x, j * leg); }
 };
 
 struct RealBlocksOut { // transform by transform
@@ -193,13 +187,11 @@ struct RealBlocksOut { // transform by transform
             h[lane][k] = a[lane];
     }
     QX_INLINE void setPair(int k, Wide a, Wide b) const {
-#ifdef __AVX2__
-        DBL *const even[] = {h[0], h[2]};
-        DBL *const odd[] = {h[1], h[3]};
-#else
-        DBL *const even[] = {h[0]};
-        DBL *const odd[] = {h[1]};
-#endif
+        DBL *even[packedColumns], *odd[packedColumns];
+        for (int pair = 0; pair < packedColumns; ++pair) {
+            even[pair] = h[2 * pair];
+            odd[pair] = h[2 * pair + 1];
+        }
         StorePairs(PairsLow(a, b), even, k);
         StorePairs(PairsHigh(a, b), odd, k);
     }

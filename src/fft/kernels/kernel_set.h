@@ -41,11 +41,15 @@ __attribute__((noinline)) void RealInArrays(const Wide *x, Wide *h) {
     RealTransform<P>::template run<Wide>(PackedArrayIn{x}, RealArrayOut{h});
 }
 
-QX_INLINE Wide Widened(Narrow x) { return Wide(x.v); }
-QX_INLINE Wide Widened(Wide x) { return x; }
-#ifdef __AVX2__
-QX_INLINE Wide Widened(One x) { return Wide(__builtin_shufflevector(x.v, x.v, 0, 1, 0, 1)); }
-#endif
+template <int N>
+QX_INLINE Wide Widened(Lanes<N> x) {
+    if constexpr (N == nativeLanes)
+        return x;
+    else if constexpr (N == 2)
+        return InEveryPair<nativeLanes>(x);
+    else
+        return Wide(x.v);
+}
 
 template <class V>
 QX_INLINE V FirstLanes(Wide x) {

@@ -29,38 +29,16 @@ template <int P, int Most>
 constexpr int primeBlock = (primeWides<P> + (primeWides<P> + Most - 1) / Most - 1) /
                            ((primeWides<P> + Most - 1) / Most);
 
-QX_INLINE Wide InEveryPair(One x) {
-#ifdef __AVX2__
-    return Wide(__builtin_shufflevector(x.v, x.v, 0, 1, 0, 1));
-#else
-    return x;
-#endif
-}
-QX_INLINE Wide FirstsTwice(Wide x) {
-#ifdef __AVX2__
-    return Wide(__builtin_shufflevector(x.v, x.v, 0, 0, 2, 2));
-#else
-    return Wide(__builtin_shufflevector(x.v, x.v, 0, 0));
-#endif
-}
-QX_INLINE Wide SecondsTwice(Wide x) {
-#ifdef __AVX2__
-    return Wide(__builtin_shufflevector(x.v, x.v, 1, 1, 3, 3));
-#else
-    return Wide(__builtin_shufflevector(x.v, x.v, 1, 1));
-#endif
-}
-
 // The frequencies of the registers First to First + Count - 1, out of `start` and the pairs (sum,
 // difference) of mirrored values.
 template <int P, int First, int Count>
 QX_INLINE void RealPrimeBlock(One start, const One *mirrored, DBL *h) {
     Wide value[Count];
     for (int i = 0; i < Count; ++i)
-        value[i] = InEveryPair(start);
+        value[i] = InEveryPair<nativeLanes>(start);
     for (int j = 0; j < P / 2; ++j) {
         const double *const turns = PrimeTurns<P>::rows + j * primeRow<P> + First * nativeLanes;
-        const Wide pair = InEveryPair(mirrored[j]);
+        const Wide pair = InEveryPair<nativeLanes>(mirrored[j]);
         for (int i = 0; i < Count; ++i)
             value[i] = value[i] + pair * Wide::load(turns + i * nativeLanes);
     }
@@ -102,13 +80,13 @@ template <int P, int First, int Count>
 QX_INLINE void ComplexPrimeBlock(One start, const One *sums, const One *differences, DBL *y) {
     Wide even[Count], odd[Count];
     for (int i = 0; i < Count; ++i) {
-        even[i] = InEveryPair(start);
+        even[i] = InEveryPair<nativeLanes>(start);
         odd[i] = Wide(0.0);
     }
     for (int j = 0; j < P / 2; ++j) {
         const double *const turns = PrimeTurns<P>::rows + j * primeRow<P> + First * nativeLanes;
-        const Wide sum = InEveryPair(sums[j]);
-        const Wide difference = InEveryPair(differences[j]);
+        const Wide sum = InEveryPair<nativeLanes>(sums[j]);
+        const Wide difference = InEveryPair<nativeLanes>(differences[j]);
         for (int i = 0; i < Count; ++i) {
             const Wide turn = Wide::load(turns + i * nativeLanes);
             even[i] = even[i] + sum * FirstsTwice(turn);
@@ -185,9 +163,7 @@ QX_INLINE void WholeRealTransform(const DBL *in, DBL *out) {
 template <int P>
 QX_INLINE void RealByHalf(const DBL *in, DBL *h, const double *turns) {
     constexpr int m = P / 2;
-    typedef int64_t Bits __attribute__((vector_size(16)));
-    const Bits imaginarySign = {0, INT64_MIN};
-    const auto conjugate = [=](One x) { return One((One::Vector)((Bits)x.v ^ imaginarySign)); };
+    const auto conjugate = [](One x) { return NegatedInPairs(x, false); };
 
     double z[P];
     WholeComplexTransform<m>(in, z);

@@ -31,8 +31,10 @@ void AddMultiple(double factor, const ConstMatrixView<E> &a, const ConstMatrixVi
 
 template <ElementType E>
 void ClearRows(const MatrixView<E> &c) {
-    for (int32_t i = 0; i < c.rows(); ++i)
-        Fill(reinterpret_cast<DBL *>(c.row(i)), std::ptrdiff_t{c.cols()} * partsOf<E>, 0.0);
+    const bool inOne = c.isWhole();
+    for (int32_t i = 0; i < (inOne ? 1 : c.rows()); ++i)
+        Fill(reinterpret_cast<DBL *>(c.row(i)),
+             std::ptrdiff_t{c.cols()} * (inOne ? c.rows() : 1) * partsOf<E>, 0.0);
 }
 
 // kept: the empty sum is NaN and not zero

@@ -107,6 +107,15 @@ struct Values {
 };
 
 template <ElementType E>
+ErrorCode LargestSingularValue(const ConstMatrixView<E> &a, double *largest) {
+    Values<E> values;
+    const ErrorCode failed = values.find(a);
+    if (failed == 0)
+        *largest = values.largest();
+    return failed;
+}
+
+template <ElementType E>
 ErrorCode ConditionByInverse(const ConstMatrixView<E> &a, int32_t normType, double *cond) {
     double norm, inverseNorm;
     if (const ErrorCode failed = MatrixNorm<E>(a, normType, &norm))
@@ -153,13 +162,9 @@ ErrorCode MatrixNorm(const ConstMatrixView<E> &a, int32_t normType, double *norm
     QX_EXPECTS(!a.isEmpty());
     if (!AllFinite<E>(a))
         return ErrNonFiniteInput;
-    Values<E> values;
     switch (normType) {
     case twoNorm:
-        if (const ErrorCode failed = values.find(a))
-            return failed;
-        *norm = values.largest();
-        return 0;
+        return LargestSingularValue<E>(a, norm);
     case oneNorm:
         *norm = LargestColumnSum<E>(a);
         return 0;
