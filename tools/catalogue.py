@@ -21,7 +21,10 @@ code stands by its name, in the order in which it is raised, with the reason in 
 What a NaN does in an input that may have one stands in the sentence "NaN:", by arguments and fields of
 records, in these words; tests/codes holds the recipes of the export to it:
 
-    NaN: x, w refused with ErrNonFiniteInput; y in all results; z.count in some results or in no result.
+    NaN: x, w refused with ErrNonFiniteInput; y in all results; z.level in some results or in no result.
+
+"In all results" means in every number of the outputs that may be one. "In no result" are those that are
+compared, skipped or not read.
 
 Which values an argument takes that chooses among few stands in a sentence that begins with its name
 and a colon, or in an indented table behind such a colon. The values ascend in a sentence, with a

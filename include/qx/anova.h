@@ -28,7 +28,8 @@ QX_API int32_t Contingency_head(QX_IN I32_2D table, QX_OUT DBL *chiSquare, QX_OU
     Codes: ErrSizeMismatch (the lengths differ), ErrEmptyInput (y is empty), ErrAnovaFewLevels (k is
     below 2 or not below the number of observations), ErrOutOfMemory (no scratch memory),
     ErrAnovaFactorEmpty (more labels than k), ErrAnovaNoReplication (fewer),
-    ErrNaNInData (f is NaN). */
+    ErrNaNInData (f is NaN).
+    NaN: y refused with ErrNaNInData. */
 QX_API int32_t Anova1Way_head(QX_IN DBL1D y, QX_IN I32_1D labels, QX_IN const int32_t *k,
                               QX_OUT DBL *ssBetween, QX_OUT DBL *msBetween, QX_OUT DBL *f,
                               QX_OUT DBL *p, QX_OUT DBL *ssError, QX_OUT DBL *msError,
@@ -39,7 +40,8 @@ QX_API int32_t Anova1Way_head(QX_IN DBL1D y, QX_IN I32_1D labels, QX_IN const in
     Codes: ErrSizeMismatch (the lengths differ), ErrEmptyInput (y is empty), ErrAnovaFewLevels (k is
     below 2 or not below the number of observations), ErrBadSignificance (alpha lies outside [0,
     1]), ErrOutOfMemory (no scratch memory), ErrAnovaFactorEmpty (more labels than k),
-    ErrAnovaNoReplication (fewer), ErrNaNInData (f is NaN). */
+    ErrAnovaNoReplication (fewer), ErrNaNInData (f is NaN).
+    NaN: y refused with ErrNaNInData; alpha in no result. */
 QX_API int32_t Anova1Way_head_2017(QX_IN DBL1D y, QX_IN I32_1D labels, QX_IN const int32_t *k,
                                    double alpha, QX_OUT DBL *ssBetween, QX_OUT DBL *msBetween,
                                    QX_OUT DBL *f, QX_OUT DBL *p, QX_OUT DBL *ssError,
@@ -75,7 +77,8 @@ QX_API int32_t Anova1Way_head_2017(QX_IN DBL1D y, QX_IN I32_1D labels, QX_IN con
     ErrAnovaFactorEmpty (a factor has more or fewer different labels than levels), ErrAnovaCellCount
     (a cell has another number of observations), ErrNaNInData (y contains NaN or an infinity),
     ErrAnovaDesign (a denominator is not above 0), ErrOutOfMemory (no scratch memory, or an array
-    cannot be resized). */
+    cannot be resized).
+    NaN: y refused with ErrNaNInData. */
 QX_API ErrorCode Anova2Way_head(QX_IN DBL1D y, QX_IN I32_1D labelsA, QX_IN I32_1D labelsB,
                                 int32_t levelsA, int32_t levelsB, int32_t observations,
                                 QX_OUT DBL1D sumsOfSquares, QX_OUT DBL1D degrees,
@@ -91,7 +94,8 @@ QX_API ErrorCode Anova2Way_head(QX_IN DBL1D y, QX_IN I32_1D labelsA, QX_IN I32_1
     ErrAnovaFactorEmpty (a factor has more or fewer different labels than levels), ErrAnovaCellCount
     (a cell has another number of observations), ErrNaNInData (y contains NaN or an infinity),
     ErrBadSignificance (significance lies outside [0, 1] or is NaN), ErrAnovaDesign (a denominator
-    is not above 0), ErrOutOfMemory (no scratch memory, or an array cannot be resized). */
+    is not above 0), ErrOutOfMemory (no scratch memory, or an array cannot be resized).
+    NaN: y refused with ErrNaNInData; significance refused with ErrBadSignificance. */
 QX_API ErrorCode Anova2Way_head_2017(QX_IN DBL1D y, QX_IN I32_1D labelsA, QX_IN I32_1D labelsB,
                                      int32_t levelsA, int32_t levelsB, int32_t observations,
                                      double significance, QX_OUT DBL1D sumsOfSquares,

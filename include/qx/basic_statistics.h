@@ -14,29 +14,34 @@
 QX_BEGIN_DECLS
 
 /** Arithmetic mean, sum(x) / n, summed from the first element to the last.
-    Codes: ErrEmptyInput (x is empty). */
+    Codes: ErrEmptyInput (x is empty).
+    NaN: x in all results. */
 QX_API int32_t Mean_head(QX_IN DBL1D x, QX_OUT DBL *mean, QX_OUT ErrorCode *err);
 
 /** Root mean square, sqrt(sum(x^2) / n). The squares of values from 1.4e154 on overflow, and those
     of values below 1.5e-162 vanish, with digits lost up to 1e-154.
-    Codes: ErrEmptyInput (x is empty). */
+    Codes: ErrEmptyInput (x is empty).
+    NaN: x in all results. */
 QX_API int32_t RMS_head(QX_IN DBL1D x, QX_OUT DBL *rms, QX_OUT ErrorCode *err);
 
 /** Root mean square of complex values, sqrt(sum(im^2 + re^2) / n), with the squares of RMS_head.
     The code is the function result.
-    Codes: ErrEmptyInput (z is empty). */
+    Codes: ErrEmptyInput (z is empty).
+    NaN: z in all results. */
 QX_API ErrorCode CxRMS_head(QX_IN CDB1D z, QX_OUT DBL *rms);
 
 /** Mean squared difference over the shorter length m, sum(x x + y (y - 2 x)) / m. Where x and y
     nearly agree the sum loses digits to cancellation. From 1e154 on the products overflow, to NaN
     where y is about as large as x, however small the difference.
-    Codes: ErrEmptyInput (x or y is empty), WarnLengthsDiffer (the lengths differ). */
+    Codes: ErrEmptyInput (x or y is empty), WarnLengthsDiffer (the lengths differ).
+    NaN: x in all results; y in all results or in no result. */
 QX_API int32_t MSE_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_OUT DBL *mse, QX_OUT ErrorCode *err);
 
 /** Central population moment, sum((x - mean)^order) / n; order 2 is the population variance. A
     power beyond the range is infinite, the sum NaN where an odd order has infinities of both signs,
     and small powers vanish.
-    Codes: ErrEmptyInput (x is empty), ErrOrderNotPositive (the order is below 1). */
+    Codes: ErrEmptyInput (x is empty), ErrOrderNotPositive (the order is below 1).
+    NaN: x in all results. */
 QX_API int32_t Moment_head(QX_IN DBL1D x, QX_IN const int32_t *order, QX_OUT DBL *moment,
                            QX_OUT ErrorCode *err);
 

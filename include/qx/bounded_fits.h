@@ -33,7 +33,9 @@ QX_BEGIN_DECLS
     (lower or upper have one element, or they differ in length), ErrNaNInData (a bound is NaN),
     ErrFitPointsTooFew (fewer samples than free coefficients), ErrNonFiniteInput (a weight is NaN or
     infinite), ErrTooFewWeights (only one weight is not 0), ErrBoundsCrossed (a lower bound is above
-    its upper one), ErrOutOfMemory (no memory where an input is y). */
+    its upper one), ErrOutOfMemory (no memory where an input is y).
+    NaN: y, x in all results; w refused with ErrNonFiniteInput; lower, upper refused with
+    ErrNaNInData. */
 QX_API ErrorCode BoundLinearFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w,
                                      QX_IN DBL1D lower, QX_IN DBL1D upper, QX_OUT double *a,
                                      QX_OUT double *b, QX_OUT double *mse);
@@ -48,7 +50,9 @@ QX_API ErrorCode BoundLinearFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1
     NaN or infinite), ErrTooFewWeights (only one weight is not 0), ErrBoundsCrossed (a lower bound
     is above its upper one), ErrOutOfMemory (no memory), ErrIterationLimit (the limit is reached,
     or lines come back without rest; all outputs are valid), WarnFitIncomplete (lower or upper have
-    one element, or they differ in length). */
+    one element, or they differ in length).
+    NaN: y, x, lower, upper refused with ErrNaNInData; w refused with ErrNonFiniteInput; tolerance
+    in no result. */
 QX_API ErrorCode BoundLinearFitLAR_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w,
                                         double tolerance, QX_INOUT int32_t *iterations,
                                         QX_IN DBL1D lower, QX_IN DBL1D upper, QX_OUT double *a,
@@ -79,7 +83,9 @@ QX_API ErrorCode BoundLinearFitBi_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DB
     start do not converge), ErrNaNInData (the residuals at the start are NaN), ErrNonFiniteInput
     (the cost is NaN or infinite at the start and at the next point), ErrSingularMatrix (a step is
     not determined), ErrBoundsCrossed (a lower bound is above its upper one), WarnFitIncomplete
-    (guess is too short). */
+    (guess is too short).
+    NaN: y, x, w refused with ErrNonFiniteInput; tolerance in no result; lower, upper refused with
+    ErrNaNInData. */
 QX_API ErrorCode BoundExpFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, double tolerance,
                                   QX_INOUT int32_t *iterations, QX_IN DBL1D guess,
                                   QX_IN DBL1D lower, QX_IN DBL1D upper, uint16_t method,
@@ -98,7 +104,9 @@ QX_API ErrorCode BoundExpFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w
     ErrIterationLimit (the singular values of the start do not converge), ErrNaNInData (the
     residuals at the start are NaN), ErrNonFiniteInput (the cost is NaN or infinite at the start
     and at the next point), ErrSingularMatrix (a step is not determined), ErrBoundsCrossed (a lower
-    bound is above its upper one), WarnFitIncomplete (guess is too short). */
+    bound is above its upper one), WarnFitIncomplete (guess is too short).
+    NaN: y, x, w, guess refused with ErrNonFiniteInput; tolerance in no result; lower, upper refused
+    with ErrNaNInData. */
 QX_API ErrorCode BoundPowerFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w,
                                     double tolerance, QX_INOUT int32_t *iterations,
                                     QX_IN DBL1D guess, QX_IN DBL1D lower, QX_IN DBL1D upper,
@@ -117,7 +125,10 @@ QX_API ErrorCode BoundPowerFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D
     one weight is not 0), ErrNotStrictlyPositive (base is 0 or below), ErrOutOfMemory (no memory),
     ErrBoundsCrossed (a lower bound is above its upper one), ErrNaNInData (a residual is NaN),
     ErrNonFiniteInput (the cost is NaN or infinite at the start and at the next point),
-    ErrSingularMatrix (a step is not determined), WarnFitIncomplete (guess has one element). */
+    ErrSingularMatrix (a step is not determined), WarnFitIncomplete (guess has one element).
+    NaN: y, base refused with ErrNaNInData or refused with ErrNonFiniteInput; x refused with
+    ErrNaNInData or refused with ErrMixedSigns; w refused with ErrNonFiniteInput; lower, upper
+    refused with ErrNaNInData; tolerance in no result. */
 QX_API ErrorCode BoundLogFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, double base,
                                   QX_INOUT int32_t *iterations, QX_IN DBL1D guess,
                                   QX_IN DBL1D lower, QX_IN DBL1D upper, uint16_t method,
@@ -135,7 +146,10 @@ QX_API ErrorCode BoundLogFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w
     starts at 0), ErrNaNInData (the residuals at the start are NaN), ErrNonFiniteInput (the cost is
     NaN or infinite at the start and at the next point), ErrSingularMatrix (a step is not
     determined), ErrBoundsCrossed (a lower bound is above its upper one), WarnFitIncomplete (guess
-    is too short). */
+    is too short).
+    NaN: y, x refused with ErrNonFiniteInput or refused with ErrNoUsableFit; w refused with
+    ErrNonFiniteInput; tolerance in no result; guess refused with ErrNonFiniteInput or in no result;
+    lower, upper refused with ErrNaNInData. */
 QX_API ErrorCode BoundGaussianFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w,
                                        double tolerance, QX_INOUT int32_t *iterations,
                                        QX_IN DBL1D guess, QX_IN DBL1D lower, QX_IN DBL1D upper,

@@ -39,7 +39,8 @@ typedef QX_ARRAY_3D(DBL) DBL3D;
     result is exact only for the polynomials of that. The code stands in *err, and a failure makes
     the result NaN.
     Codes: ErrEmptyInput (x is empty), ErrInvalidSelector (the rule is another), ErrSizesDisagree (x
-    has fewer samples than a panel). */
+    has fewer samples than a panel).
+    NaN: x, dt in all results. */
 QX_API int32_t NumerIntegration_head(QX_IN DBL1D x, QX_IN const double *dt,
                                      QX_IN const int32_t *rule, QX_OUT double *result,
                                      QX_OUT ErrorCode *err);
@@ -47,14 +48,16 @@ QX_API int32_t NumerIntegration_head(QX_IN DBL1D x, QX_IN const double *dt,
 /** As NumerIntegration_head. rule: 0 to 5. Samples left over are taken at the start of the data,
     by a one-sided formula of the rule's own order. The code is the function result.
     Codes: ErrEmptyInput (x is empty), ErrSizesDisagree (x has fewer than rule + 2 samples, or than
-   2 for rules 4 and 5), ErrInvalidSelector (the rule is another). */
+   2 for rules 4 and 5), ErrInvalidSelector (the rule is another).
+    NaN: x in all results or in no result; dt in all results. */
 QX_API ErrorCode NumerIntegration_2017_head(QX_IN DBL1D x, QX_IN const double *dt,
                                             QX_IN const int32_t *rule, QX_OUT double *result);
 
 /** Definite integral over both dimensions. rule: as NumerIntegration_head. Each row has
    the step dts[0], and the rows' integrals have dts[1]. A failure makes the result NaN. Codes:
    ErrSizesDisagree (a dimension is below 3 or shorter than a panel), ErrFewerThanTwo (fewer than
-   two steps), ErrInvalidSelector (the rule is another), ErrOutOfMemory (no scratch memory). */
+   two steps), ErrInvalidSelector (the rule is another), ErrOutOfMemory (no scratch memory).
+    NaN: x in all results; dts in all results or in no result. */
 QX_API ErrorCode NumerIntegration2D_head(QX_IN DBL2D x, QX_IN DBL1D dts, uint16_t rule,
                                          QX_OUT double *result);
 /** As NumerIntegration2D_head, by the formulas of NumerIntegration_2017_head; rules 4 and 5 are
@@ -68,7 +71,8 @@ QX_API ErrorCode NumerIntegration2D_2017_head(QX_IN DBL2D x, QX_IN DBL1D dts, ui
     rule: as NumerIntegration_head.
     Codes: ErrSizesDisagree (a dimension is below 3 or shorter than a panel), ErrFewerThanThree
     (fewer than three steps), ErrInvalidSelector (the rule is another), ErrOutOfMemory (no scratch
-    memory). */
+    memory).
+    NaN: dts in all results or in no result. */
 QX_API ErrorCode NumerIntegration3D_head(QX_IN DBL3D x, QX_IN DBL1D dts, uint16_t rule,
                                          QX_OUT double *result);
 /** As NumerIntegration3D_head, by the formulas of NumerIntegration_2017_head; rules 4 and 5 are
@@ -79,7 +83,8 @@ QX_API ErrorCode NumerIntegration3D_2017_head(QX_IN DBL3D x, QX_IN DBL1D dts, ui
 /** Running integral by Simpson's rule around each sample,
     y[i] = y[i-1] + (x[i-1] + 4 x[i] + x[i+1]) dt/6, with *initial before and *final behind the
    data. Codes: ErrEmptyInput (x is empty), ErrSamplingNotPositive (*dt is 0 or
-   below). */
+   below).
+    NaN: x in all results or in some results; initial, dt in all results; final in some results. */
 QX_API int32_t Integral(QX_INOUT DBL1D x, QX_IN const double *initial, QX_IN const double *final,
                         QX_IN const double *dt, QX_OUT ErrorCode *err);
 
@@ -94,7 +99,9 @@ QX_API int32_t Integral(QX_INOUT DBL1D x, QX_IN const double *initial, QX_IN con
 
     Codes: ErrSamplingNotPositive (dt is 0 or below), ErrEmptyInput (x is empty),
     ErrInvalidSelector (the rule is another), ErrEmptyInput (one value is missing), ErrFewerThanTwo
-    (one of two values is missing). */
+    (one of two values is missing).
+    NaN: x in all results or in some results or in no result; initial in all results or in no
+    result; final in some results or in no result; dt in all results or in some results. */
 QX_API ErrorCode Integral90(QX_INOUT DBL1D x, QX_IN DBL1D initial, QX_IN DBL1D final, double dt,
                             int32_t rule);
 
@@ -102,11 +109,13 @@ QX_API ErrorCode Integral90(QX_INOUT DBL1D x, QX_IN DBL1D initial, QX_IN DBL1D f
     formulas, each other by a whole panel from the one a panel before. rule: 0 to 5.
     Codes: ErrSamplingNotPositive (dt is 0 or below), ErrEmptyInput (x is empty), ErrSizesDisagree
    (x has fewer than rule + 2 samples, or than 2 for rules 4 and 5), ErrInvalidSelector (the rule is
-    another). */
+    another).
+    NaN: x in some results or in no result; dt in some results. */
 QX_API ErrorCode Integral_2017(QX_INOUT DBL1D x, double dt, int32_t rule);
 
 /** Central derivative (x[i+1] - x[i-1]) / (2 dt), with *initial before and *final behind the data.
-    Codes: ErrSamplingNotPositive (*dt is not above 0), ErrEmptyInput (x is empty). */
+    Codes: ErrSamplingNotPositive (*dt is not above 0), ErrEmptyInput (x is empty).
+    NaN: x, initial, final in some results; dt refused with ErrSamplingNotPositive. */
 QX_API int32_t Derivative(QX_INOUT DBL1D x, QX_IN const double *initial, QX_IN const double *final,
                           QX_IN const double *dt, QX_OUT ErrorCode *err);
 
@@ -119,7 +128,8 @@ QX_API int32_t Derivative(QX_INOUT DBL1D x, QX_IN const double *initial, QX_IN c
 
     Codes: ErrEmptyInput (x is empty), ErrSamplingNotPositive (*dt is 0 or below),
     ErrInvalidSelector (the rule is another), ErrEmptyInput (rules 0, 2 and 3: a value is missing),
-    ErrFewerThanTwo (rule 1: one of two values is missing). */
+    ErrFewerThanTwo (rule 1: one of two values is missing).
+    NaN: x in some results; initial, final in some results or in no result; dt in all results. */
 QX_API ErrorCode Derivative85(QX_INOUT DBL1D x, QX_IN DBL1D initial, QX_IN DBL1D final,
                               QX_IN const double *dt, int32_t rule);
 

@@ -18,7 +18,8 @@ QX_BEGIN_DECLS
     Codes: ErrEmptyInput (in is empty), ErrInvalidSelector (no such method), ErrOutOfMemory (the
     host refuses out, or no memory), ErrNonFiniteInput (a is not finite), ErrTooFewWeights (|a|^2 is
     0: a number below about 1e-162 counts as 0), ErrNonFiniteInput (w is not finite),
-    ErrTooFewWeights (|w|^2 is 0). */
+    ErrTooFewWeights (|w|^2 is 0).
+    NaN: in in all results; a.im, a.re, w.im, w.re refused with ErrNonFiniteInput. */
 QX_API ErrorCode ChirpZT_head(QX_IN DBL1D in, QX_IN const CDB *a, QX_IN const CDB *w, int32_t count,
                               uint32_t method, QX_OUT CDB1D out);
 /** As ChirpZT_head, for complex data. */
@@ -34,7 +35,9 @@ QX_API ErrorCode CxChirpZT_head(QX_IN CDB1D in, QX_IN const CDB *a, QX_IN const 
     Codes: ErrEmptyInput (in is empty), ErrSizesDisagree (count is above n), ErrOutOfMemory (the
     host refuses out), ErrNonFiniteInput (a is not finite), ErrTooFewWeights (|a|^2 is 0),
     ErrNonFiniteInput (w is not finite), ErrTooFewWeights (|w|^2 is 0), ErrOutOfMemory (no memory),
-    ErrDegenerateValue (1/a is 0, or two points agree to rounding). */
+    ErrDegenerateValue (1/a is 0, or two points agree to rounding).
+    NaN: in in all results or in no result; a.im, a.re, w.im, w.re refused with
+    ErrNonFiniteInput. */
 QX_API ErrorCode InvChirpZT_head(QX_IN CDB1D in, QX_IN const CDB *a, QX_IN const CDB *w,
                                  int32_t count, QX_OUT CDB1D out);
 

@@ -17,7 +17,8 @@ QX_BEGIN_DECLS
 /** out[t] = sum over i of x[i] y[t - i], nx + ny - 1 values. The code is in *err. Any other
     algorithm is a success that leaves in out what stands there.
     Codes: ErrEmptyInput (x or y is empty), ErrOutOfMemory (the host refuses the output, or no
-    memory). A failure empties out. */
+    memory). A failure empties out.
+    NaN: x, y in all results or in some results. */
 QX_API int32_t Convolution(QX_IN DBL1D x, QX_IN DBL1D y, QX_OUT DBL1D out,
                            QX_IN const int32_t *algorithm, QX_OUT ErrorCode *err);
 
@@ -26,7 +27,8 @@ QX_API int32_t Convolution(QX_IN DBL1D x, QX_IN DBL1D y, QX_OUT DBL1D out,
     ignores the normalization.
     Codes: ErrEmptyInput (x or y is empty; out stays as it is), the host's status (it refuses the
     output), ErrInvalidSelector (no such normalization of a correlation, or no such algorithm),
-    ErrOutOfMemory (no memory). All but the first empty out. */
+    ErrOutOfMemory (no memory). All but the first empty out.
+    NaN: x, y in all results or in some results. */
 QX_API ErrorCode CxConvolution(QX_IN CDB1D x, QX_IN CDB1D y, QX_OUT CDB1D out, int32_t algorithm,
                                int32_t correlate, int32_t normalization);
 
@@ -34,7 +36,8 @@ QX_API ErrorCode CxConvolution(QX_IN CDB1D x, QX_IN CDB1D y, QX_OUT CDB1D out, i
     nx - 1 being lag zero. The code is in *err. Any other algorithm leaves in out what stands
     there, normalized. An array with itself takes two transforms in place of three.
     Codes: ErrEmptyInput (x or y is empty), ErrOutOfMemory (the host refuses the output, or no
-    memory), ErrInvalidSelector (no such normalization). A failure empties out. */
+    memory), ErrInvalidSelector (no such normalization). A failure empties out.
+    NaN: x, y in all results or in some results. */
 QX_API int32_t Rxy80(QX_IN DBL1D x, QX_IN DBL1D y, QX_OUT DBL1D out, QX_IN const int32_t *algorithm,
                      int32_t normalization, QX_OUT ErrorCode *err);
 /** As Rxy80, without a normalization.
@@ -48,7 +51,8 @@ QX_API int32_t Rxy(QX_IN DBL1D x, QX_IN DBL1D y, QX_OUT DBL1D out, QX_IN const i
     the call succeeds, the size is the new one, and as much of the result is written as the block
     of n values holds.
     Codes: ErrEmptyInput (x is empty), ErrOutOfMemory (no memory), ErrInvalidSelector (no such
-    normalization; the result stands, unnormalized). */
+    normalization; the result stands, unnormalized).
+    NaN: x in all results. */
 QX_API int32_t AutoCorrelation80(QX_INOUT DBL1D x, int32_t normalization, QX_OUT ErrorCode *err);
 /** As AutoCorrelation80, without a normalization.
     Codes: ErrEmptyInput (x is empty), ErrOutOfMemory (no memory). */
@@ -60,7 +64,8 @@ QX_API int32_t AutoCorrelation(QX_INOUT DBL1D x, QX_OUT ErrorCode *err);
     and the function result.
     Codes: ErrLengthTooLarge (an input of more than 8388608 values), ErrEmptyInput (xy or y is
     empty), ErrSizesDisagree (y is the longer one), ErrOutOfMemory (no memory). A failure empties
-    xy. */
+    xy.
+    NaN: xy, y in all results. */
 QX_API int32_t Deconvolution(QX_INOUT DBL1D xy, QX_IN DBL1D y, QX_OUT ErrorCode *err);
 
 QX_END_DECLS

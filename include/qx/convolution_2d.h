@@ -14,7 +14,8 @@ QX_BEGIN_DECLS
     Codes: ErrEmptyInput (x or y is empty), ErrInvalidSelector (no such outputSize; last of all,
     no such algorithm), ErrSizesDisagree (outputSize 2 and y exceeds x), ErrOutOfMemory (the host
     refuses the output, or no memory). Up to ErrSizesDisagree out stays as it is; what comes later
-    empties it. */
+    empties it.
+    NaN: x, y in all results or in some results. */
 QX_API ErrorCode Convolve_2DH(QX_IN DBL2D x, QX_IN DBL2D y, QX_OUT DBL2D out, int32_t outputSize,
                               int32_t algorithm);
 /** As Convolve_2DH, for complex data, and with outputSize 2 an x or a y that is wider than tall
@@ -26,7 +27,8 @@ QX_API ErrorCode CxConvolve_2DH(QX_IN CDB2D x, QX_IN CDB2D y, QX_OUT CDB2D out, 
     row xRows - 1, column xCols - 1. algorithm: as CxConvolution.
     Codes: ErrEmptyInput (x or y is empty; out stays as it is), ErrOutOfMemory (the host refuses
     the output, or no memory), ErrInvalidSelector (no such algorithm). All but the first empty
-    out. */
+    out.
+    NaN: x, y in all results or in some results. */
 QX_API ErrorCode Correlation_2DH(QX_IN DBL2D x, QX_IN DBL2D y, QX_OUT DBL2D out, int32_t algorithm);
 /** As Correlation_2DH, for complex data; x is conjugated. */
 QX_API ErrorCode CxCorrelation_2DH(QX_IN CDB2D x, QX_IN CDB2D y, QX_OUT CDB2D out,

@@ -41,7 +41,8 @@ QX_BEGIN_DECLS
     y sin(angle), newY = y cos(angle) - x sin(angle). Coordinates beyond the range of a double
     become infinite.
     Codes: ErrSizesDisagree (x and y differ in length), ErrNonFiniteInput (a coordinate or the
-    angle), ErrOutOfMemory (an array cannot be resized). */
+    angle), ErrOutOfMemory (an array cannot be resized).
+    NaN: x, y, angle refused with ErrNonFiniteInput. */
 QX_API ErrorCode CoordRotation2D_head(QX_IN DBL1D x, QX_IN DBL1D y, double angle, QX_OUT DBL1D newX,
                                       QX_OUT DBL1D newY);
 
@@ -50,14 +51,16 @@ QX_API ErrorCode CoordRotation2D_head(QX_IN DBL1D x, QX_IN DBL1D y, double angle
     Codes: ErrSizesDisagree (x, y and z differ in length, or the matrix is not 3 by 3),
     ErrNonFiniteInput (a coordinate or an element of the matrix), ErrBadCoefficients (no rotation:
     an element of R'R - 1 beyond 1e-6, or the determinant is -1), ErrOutOfMemory (an array cannot be
-    resized). */
+    resized).
+    NaN: x, y, z, direction refused with ErrNonFiniteInput. */
 QX_API ErrorCode CoordRotationDirection_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D z,
                                              QX_IN DBL2D direction, QX_OUT DBL1D newX,
                                              QX_OUT DBL1D newY, QX_OUT DBL1D newZ);
 
 /** Coordinates of points of space in the system turned by three Euler angles (see above).
     Codes: ErrSizesDisagree (x, y and z differ in length), ErrInvalidSelector (sequence),
-    ErrNonFiniteInput (a coordinate or an angle), ErrOutOfMemory (an array cannot be resized). */
+    ErrNonFiniteInput (a coordinate or an angle), ErrOutOfMemory (an array cannot be resized).
+    NaN: x, y, z, angle1, angle2, angle3 refused with ErrNonFiniteInput. */
 QX_API ErrorCode CoordRotationEuler2011_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D z,
                                              double angle1, double angle2, double angle3,
                                              int32_t sequence, QX_OUT DBL1D newX, QX_OUT DBL1D newY,
@@ -70,7 +73,8 @@ QX_API ErrorCode CoordRotationEuler_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL
 /** The direction matrix R = R3 R2 R1 of three Euler angles (see above), each element within an ulp
     of 1 of the rotation by exactly these angles.
     Codes: ErrInvalidSelector (sequence), ErrNonFiniteInput (an angle), ErrOutOfMemory (an array
-    cannot be resized). */
+    cannot be resized).
+    NaN: angle1, angle2, angle3 refused with ErrNonFiniteInput. */
 QX_API ErrorCode Euler2Direction2011_head(double angle1, double angle2, double angle3,
                                           int32_t sequence, QX_OUT DBL2D direction);
 /** As Euler2Direction2011_head, with sequence 10 (ZYX). */
@@ -84,7 +88,8 @@ QX_API ErrorCode Euler2Direction_head(double angle1, double angle2, double angle
     of the angles is within 4 eps of the rotation nearest to `direction`, at the lock within 12 eps.
     Codes: ErrSizesDisagree (the matrix is not 3 by 3), ErrInvalidSelector (sequence),
     ErrNonFiniteInput (an element), ErrBadCoefficients (no rotation: an element of R'R - 1 beyond
-    1e-6, or the determinant is -1). */
+    1e-6, or the determinant is -1).
+    NaN: direction refused with ErrNonFiniteInput. */
 QX_API ErrorCode Direction2Euler2011_head(QX_IN DBL2D direction, int32_t sequence,
                                           QX_OUT double *angle1, QX_OUT double *angle2,
                                           QX_OUT double *angle3);
@@ -97,7 +102,8 @@ QX_API ErrorCode Direction2Euler2011_head(QX_IN DBL2D direction, int32_t sequenc
     they have no meaning. Inputs need not keep to these ranges. Where `from` and `to` are the same
     the arrays are copied as they are. Values beyond the range of a double become infinite.
     Codes: ErrSizesDisagree (the arrays differ in length), ErrInvalidSelector (from, to),
-    ErrNonFiniteInput (a coordinate), ErrOutOfMemory (an array cannot be resized). */
+    ErrNonFiniteInput (a coordinate), ErrOutOfMemory (an array cannot be resized).
+    NaN: first, second, third refused with ErrNonFiniteInput. */
 QX_API ErrorCode CoordConversion_head(int32_t from, int32_t to, QX_IN DBL1D first,
                                       QX_IN DBL1D second, QX_IN DBL1D third, QX_OUT DBL1D newFirst,
                                       QX_OUT DBL1D newSecond, QX_OUT DBL1D newThird);

@@ -18,7 +18,8 @@ QX_BEGIN_DECLS
     neighbours; values behind the last whole group are dropped. The function result is 0, or the
     host's own status where it refused the resize.
     Codes: ErrEmptyInput (x is empty), ErrDecimationOutOfRange (*factor is below 1 or above the size
-    of x), ErrOutOfMemory (no memory). */
+    of x), ErrOutOfMemory (no memory).
+    NaN: x in some results or in no result. */
 QX_API int32_t DecimateCIN(QX_INOUT DBL1D x, QX_IN const int32_t *factor,
                            QX_IN const uint8_t *average, QX_OUT ErrorCode *err);
 /** As DecimateCIN, for complex data, with scalars by value; the code is the function result. */
@@ -29,11 +30,13 @@ QX_API ErrorCode CxDecimate_H(QX_INOUT CDB1D x, int32_t factor, int32_t average)
     goes on in *partialCount and *partialSum, which `reset` clears; *start then tells how many
     samples it needs.
     Codes: ErrNotStrictlyPositive (factor below 1), ErrNegativeSetting (*start is negative),
-    ErrOutOfMemory (no memory). */
+    ErrOutOfMemory (no memory).
+    NaN: x, partialSum in some results or in no result. */
 QX_API ErrorCode DecimateContinuous_H(QX_INOUT DBL1D x, int32_t factor, int32_t average,
                                       QX_INOUT int32_t *start, int32_t reset,
                                       QX_INOUT int32_t *partialCount, QX_INOUT double *partialSum);
-/** As DecimateContinuous_H, for complex data. */
+/** As DecimateContinuous_H, for complex data.
+    NaN: x, partialSum.im, partialSum.re in some results or in no result. */
 QX_API ErrorCode CxDecimateContinuous_H(QX_INOUT CDB1D x, int32_t factor, int32_t average,
                                         QX_INOUT int32_t *start, int32_t reset,
                                         QX_INOUT int32_t *partialCount, QX_INOUT CDB *partialSum);
@@ -43,7 +46,8 @@ QX_API ErrorCode CxDecimateContinuous_H(QX_INOUT CDB1D x, int32_t factor, int32_
     dropped.
     Codes: ErrOrderNotPositive (h is empty), ErrNotStrictlyPositive (L below 1),
     ErrMultirateStateSize (state has another size, without reset), the host's status (it refuses the
-    state), ErrOutOfMemory (no memory). */
+    state), ErrOutOfMemory (no memory).
+    NaN: x, gain, h in some results; state in some results or in no result. */
 QX_API ErrorCode InterpolatedFIRH(QX_IN DBL1D x, QX_OUT DBL1D y, int32_t L, double gain,
                                   QX_IN DBL1D h, QX_INOUT DBL1D state, uint8_t reset,
                                   QX_INOUT int32_t *delay);
@@ -51,7 +55,8 @@ QX_API ErrorCode InterpolatedFIRH(QX_IN DBL1D x, QX_OUT DBL1D y, int32_t L, doub
 /** Interpolates a stream by L: y[i L + p] = gain L sum over k of h[p + k L] x[i - k]. state has
     ceil(size of h / L) elements. The first *delay outputs are dropped.
     Codes: ErrOrderNotPositive (h is empty), ErrNotStrictlyPositive (L below 1),
-    ErrMultirateStateSize (state has another size, without reset), ErrOutOfMemory (no memory). */
+    ErrMultirateStateSize (state has another size, without reset), ErrOutOfMemory (no memory).
+    NaN: x, gain, h in some results; state in no result. */
 QX_API ErrorCode InterpolatorFIRH(QX_IN DBL1D x, QX_OUT DBL1D y, double gain, int32_t L,
                                   QX_IN DBL1D h, QX_INOUT DBL1D state, uint8_t reset,
                                   QX_INOUT int32_t *delay);
@@ -60,7 +65,8 @@ QX_API ErrorCode InterpolatorFIRH(QX_IN DBL1D x, QX_OUT DBL1D y, double gain, in
     applied: scale the taps instead. state has ceil(size of h / M) + 1 elements: outputs under way,
     and the phase. The first *delay outputs are dropped.
     Codes: ErrOrderNotPositive (h is empty), ErrNotStrictlyPositive (M below 1),
-    ErrMultirateStateSize (state has another size, without reset), ErrOutOfMemory (no memory). */
+    ErrMultirateStateSize (state has another size, without reset), ErrOutOfMemory (no memory).
+    NaN: x in some results; gain, state in no result; h in some results or in no result. */
 QX_API ErrorCode DecimatorFIRH(QX_IN DBL1D x, QX_OUT DBL1D y, double gain, int32_t M, QX_IN DBL1D h,
                                QX_INOUT DBL1D state, uint8_t reset, int32_t firstPhase,
                                QX_INOUT int32_t *delay);
@@ -74,7 +80,8 @@ QX_API ErrorCode DecimatorFIRH(QX_IN DBL1D x, QX_OUT DBL1D y, double gain, int32
     however short x is. The first output is that of input *delay.
     Codes: ErrNotStrictlyPositive (stages, factor or differentialDelay below 1),
     ErrMultirateStateSize (state has another size, without reset), the host's status (it refuses the
-    state), ErrOutOfMemory (no memory), WarnMultirateEmpty (x is empty). */
+    state), ErrOutOfMemory (no memory), WarnMultirateEmpty (x is empty).
+    NaN: x in some results; state in some results or in no result. */
 QX_API ErrorCode CICDecimatorByMovH(QX_IN DBL1D x, QX_OUT DBL1D y, QX_INOUT DBL1D state,
                                     int32_t stages, int32_t factor, int32_t differentialDelay,
                                     int16_t alternate, uint8_t reset, QX_INOUT int32_t *delay);
@@ -83,19 +90,22 @@ QX_API ErrorCode CICDecimatorByMovH(QX_IN DBL1D x, QX_OUT DBL1D y, QX_INOUT DBL1
     the same cost. The first *delay outputs are dropped.
     Codes: ErrNotStrictlyPositive (stages, factor or differentialDelay below 1),
     ErrMultirateStateSize (state has another size, without reset), the host's status (it refuses the
-    state), ErrOutOfMemory (no memory), WarnMultirateEmpty (x is empty). */
+    state), ErrOutOfMemory (no memory), WarnMultirateEmpty (x is empty).
+    NaN: x, state in some results. */
 QX_API ErrorCode CICInterpolatorByMovH(QX_IN DBL1D x, QX_OUT DBL1D y, QX_INOUT DBL1D state,
                                        int32_t stages, int32_t factor, int32_t differentialDelay,
                                        int16_t alternate, uint8_t reset, QX_INOUT int32_t *delay);
 
 /** Sums of groups of `factor` samples of a stream, in the first *outCount elements of x, which
    keeps its size. They are sums and not means: scale them by 1 / factor. The group under way stands
-   in *sum and *count. A factor below 2 leaves x as it is. Codes: none. */
+   in *sum and *count. A factor below 2 leaves x as it is. Codes: none.
+    NaN: x, sum in some results. */
 QX_API ErrorCode ReDecimatedMovingAverageH(QX_INOUT DBL1D x, int32_t factor, QX_INOUT double *sum,
                                            QX_INOUT int32_t *count, int32_t reset,
                                            QX_OUT int32_t *outCount);
 /** As ReDecimatedMovingAverageH, for complex data.
-    Codes: none. */
+    Codes: none.
+    NaN: x, sum.im, sum.re in some results. */
 QX_API ErrorCode CxDecimatedMovingAverageH(QX_INOUT CDB1D x, int32_t factor, QX_INOUT CDB *sum,
                                            QX_INOUT int32_t *count, int32_t reset,
                                            QX_OUT int32_t *outCount);
@@ -106,7 +116,8 @@ QX_API ErrorCode CxDecimatedMovingAverageH(QX_INOUT CDB1D x, int32_t factor, QX_
     reset. They have `stages` and stages by width elements, whatever x has; time grows as the
     elements of x times stages. Nothing happens for stages below 1, and without reset for a width
     below 2.
-    Codes: ErrOutOfMemory (no memory). */
+    Codes: ErrOutOfMemory (no memory).
+    NaN: x in some results; sums, buffers in some results or in no result. */
 QX_API ErrorCode ReCascadedMovingAverageH(QX_INOUT DBL1D x, int32_t stages, int32_t width,
                                           QX_INOUT DBL1D sums, QX_INOUT DBL2D buffers,
                                           QX_INOUT int32_t *position, int32_t reset);
@@ -121,7 +132,8 @@ QX_API ErrorCode CxCascadedMovingAverageH(QX_INOUT CDB1D x, int32_t stages, int3
     pi is not finite, makes *phase and all outputs but the first NaN with code 0, and so every later
     block of the stream. The rotation from sample to sample loses about one rounding error a sample;
     a ratio far above 1 loses the digits of its fraction.
-    Codes: none. */
+    Codes: none.
+    NaN: x, frequency, sampleRate in some results; phase in all results. */
 QX_API ErrorCode CxComplexModulatorH(QX_INOUT CDB1D x, double frequency, double sampleRate,
                                      QX_INOUT double *phase);
 /** As CxComplexModulatorH, for real data, with the result in y. An empty x leaves y as it is.

@@ -20,7 +20,8 @@ QX_BEGIN_DECLS
     Codes: ErrOrderNotPositive (S below 1), ErrFFTSizeNotPositive (size or N below 1),
     ErrInternal (the word holds something else than a plan), ErrOutOfMemory (no memory), the host's
    status, ErrLengthTooLarge (an index would pass int32). A negative status empties out. An empty
-   input gives an empty output and 0. */
+   input gives an empty output and 0.
+    NaN: in in some results. */
 QX_API ErrorCode ReDZTH(QX_INOUT DBL1D in, int32_t S, int32_t N, int32_t start, int32_t size,
                         QX_OUT CDB1D out, QX_INOUT PlanSlot *slot);
 /** As ReDZTH, with its plan in the host's instance data. */

@@ -20,7 +20,8 @@ QX_BEGIN_DECLS
    random elements that halve from row to row and from column to column do from order 110 on. Codes:
    ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory),
     ErrInvalidSelector (*output is not 0 or 1), ErrNonFiniteInput (an element is not finite),
-    ErrIterationLimit (40 iterations were not enough for a value). */
+    ErrIterationLimit (40 iterations were not enough for a value).
+    NaN: a refused with ErrNonFiniteInput. */
 QX_API int32_t EigenValueVector_head(QX_IN DBL2D a, QX_IN const int32_t *output,
                                      QX_OUT CDB1D values, QX_OUT CDB2D vectors,
                                      QX_OUT ErrorCode *err);
@@ -40,7 +41,8 @@ QX_API int32_t CxEigenValueVector_head(QX_IN CDB2D a, QX_IN const int32_t *matri
    implicit QL iteration. The error of a value is a few n eps times the largest one. Codes:
    ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory),
     ErrInvalidSelector (*output is not 0 or 1), ErrNonFiniteInput (an element is not finite),
-    ErrIterationLimit (100 iterations were not enough for a value). */
+    ErrIterationLimit (100 iterations were not enough for a value).
+    NaN: a refused with ErrNonFiniteInput. */
 QX_API int32_t SymEvectorEvalue_head(QX_INOUT DBL2D a, QX_IN const int32_t *output,
                                      QX_OUT DBL1D values, QX_OUT ErrorCode *err);
 
@@ -49,7 +51,8 @@ QX_API int32_t SymEvectorEvalue_head(QX_INOUT DBL2D a, QX_IN const int32_t *outp
     eigenvalues as they stand along the diagonal. With wantVectors 0 u is empty.
     Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrOutOfMemory (no memory),
     ErrNonFiniteInput (an element is not finite), ErrIterationLimit (the iteration did not
-    converge). */
+    converge).
+    NaN: a refused with ErrNonFiniteInput. */
 QX_API ErrorCode Schur_head(QX_INOUT DBL2D a, int32_t wantVectors, QX_OUT DBL2D u, QX_OUT CDB1D w);
 /** As Schur_head, for complex elements: a = u t u^H with a triangular t. */
 QX_API ErrorCode CxSchur_head(QX_INOUT CDB2D a, int32_t wantVectors, QX_OUT CDB2D u,

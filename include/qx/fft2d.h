@@ -17,20 +17,24 @@ QX_BEGIN_DECLS
     has given the output.
     Codes: ErrEmptyInput (in is empty), ErrIndexOutOfRange (a start behind the end),
     ErrSizesDisagree (rows or cols below 1), ErrInternal (the word holds something else than a
-    plan), ErrOutOfMemory (no memory), the host's status, ErrIndexOutOfRange (a negative start). */
+    plan), ErrOutOfMemory (no memory), the host's status, ErrIndexOutOfRange (a negative start).
+    NaN: in in all results or in no result. */
 QX_API ErrorCode CxFFT2D_H(QX_IN CDB2D in, int32_t rowStart, int32_t colStart, int32_t rows,
                            int32_t cols, int32_t shift, QX_OUT CDB2D out,
                            QX_INOUT PlanSlot *slotCols, QX_INOUT PlanSlot *slotRows);
-/** As CxFFT2D_H, with its plans in the host's instance data. */
+/** As CxFFT2D_H, with its plans in the host's instance data.
+    NaN: in in all results. */
 QX_API ErrorCode CxFFT2D_H_IDP(QX_IN CDB2D in, int32_t rowStart, int32_t colStart, int32_t rows,
                                int32_t cols, int32_t shift, QX_OUT CDB2D out,
                                QX_INOUT InstanceWord *instance);
 
-/** As CxFFT2D_H, of a real matrix. */
+/** As CxFFT2D_H, of a real matrix.
+    NaN: in in some results or in no result. */
 QX_API ErrorCode ReFFT2D_H(QX_IN DBL2D in, int32_t rowStart, int32_t colStart, int32_t rows,
                            int32_t cols, int32_t shift, QX_OUT CDB2D out,
                            QX_INOUT PlanSlot *slotCols, QX_INOUT PlanSlot *slotRows);
-/** As ReFFT2D_H, with its plans in the host's instance data. */
+/** As ReFFT2D_H, with its plans in the host's instance data.
+    NaN: in in some results. */
 QX_API ErrorCode ReFFT2D_H_IDP(QX_IN DBL2D in, int32_t rowStart, int32_t colStart, int32_t rows,
                                int32_t cols, int32_t shift, QX_OUT CDB2D out,
                                QX_INOUT InstanceWord *instance);
@@ -39,7 +43,8 @@ QX_API ErrorCode ReFFT2D_H_IDP(QX_IN DBL2D in, int32_t rowStart, int32_t colStar
     non-zero: x[a][b] = 1/(rows cols) sum over r and c of X[r][c] exp(2 pi i (r a / rows + c b /
     cols)). slotCols keeps the plan of the column count, slotRows that of the row count.
     Codes: ErrEmptyInput (in is empty), ErrInternal (the word holds something else than a plan),
-    ErrOutOfMemory (no memory), the host's status. */
+    ErrOutOfMemory (no memory), the host's status.
+    NaN: in in all results. */
 QX_API ErrorCode CxInvFFT2D_H(QX_IN CDB2D in, int32_t shift, QX_OUT CDB2D out,
                               QX_INOUT PlanSlot *slotCols, QX_INOUT PlanSlot *slotRows);
 /** As CxInvFFT2D_H, with its plans in the host's instance data. */
@@ -47,7 +52,8 @@ QX_API ErrorCode CxInvFFT2D_H_IDP(QX_IN CDB2D in, int32_t shift, QX_OUT CDB2D ou
                                   QX_INOUT InstanceWord *instance);
 
 /** As CxInvFFT2D_H, of the spectrum of a real matrix: rows of negative row frequency are not
-    read. */
+    read.
+    NaN: in in all results or in no result. */
 QX_API ErrorCode ReInvFFT2D_H(QX_IN CDB2D in, int32_t shift, QX_OUT DBL2D out,
                               QX_INOUT PlanSlot *slotCols, QX_INOUT PlanSlot *slotRows);
 /** As ReInvFFT2D_H, with its plans in the host's instance data. */

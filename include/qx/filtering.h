@@ -24,7 +24,8 @@ QX_BEGIN_DECLS
     and cleared otherwise. The code is in *err; where the host refuses a state, the function
     result is its status and that state is emptied.
     Codes: ErrEmptyInput (x is empty), ErrSizesDisagree (a without b; x is emptied),
-    ErrOutOfMemory (the host refuses a state; or no memory, then x is emptied). */
+    ErrOutOfMemory (the host refuses a state; or no memory, then x is emptied).
+    NaN: x, a, b in some results; xState, yState in some results or in no result. */
 QX_API int32_t IIR_Filter(QX_INOUT DBL1D x, QX_IN DBL1D a, QX_IN DBL1D b, QX_INOUT DBL1D xState,
                           QX_INOUT DBL1D yState, QX_IN const uint8_t *keepState,
                           QX_OUT ErrorCode *err);
@@ -41,7 +42,8 @@ QX_API int32_t CxIIR_Filter_H(QX_INOUT CDB1D x, QX_IN CDB1D a, QX_IN CDB1D b, QX
     coefficients y is x. The states are kept from the last call if *keepState is 1 and cleared
     otherwise.
     Codes: ErrEmptyInput (x is empty), ErrSizesDisagree (a without b), ErrOutOfMemory (the host
-    refuses y or a state, or no memory). A failure empties y, and a refused state. */
+    refuses y or a state, or no memory). A failure empties y, and a refused state.
+    NaN: x, a, b, xState, yState in some results. */
 QX_API ErrorCode CxIIRReSig_Filter_H(QX_IN DBL1D x, QX_OUT CDB1D y, QX_IN CDB1D a, QX_IN CDB1D b,
                                      QX_INOUT DBL1D xState, QX_INOUT CDB1D yState,
                                      QX_IN const uint8_t *keepState);
@@ -49,7 +51,8 @@ QX_API ErrorCode CxIIRReSig_Filter_H(QX_IN DBL1D x, QX_OUT CDB1D y, QX_IN CDB1D 
 /** Filters x in place, in direct form, with the state of x and, behind it, that of y in one
     array. It is kept from the last call if *keepState is 1 and cleared otherwise.
     Codes: ErrEmptyInput (x is empty), ErrSizesDisagree (a without b), ErrOutOfMemory (the host
-    refuses the state, or no memory). A failure empties x and the state. */
+    refuses the state, or no memory). A failure empties x and the state.
+    NaN: x, a, b in some results; state in no result. */
 QX_API ErrorCode IIR_Filter_OneState(QX_INOUT DBL1D x, QX_IN DBL1D a, QX_IN DBL1D b,
                                      QX_INOUT DBL1D state, QX_IN const uint8_t *keepState);
 /** As IIR_Filter_OneState, for a complex signal: its parts run through the same coefficients. */
@@ -64,7 +67,8 @@ QX_API ErrorCode CxSigIIR_Filter_OneState(QX_INOUT CDB1D x, QX_IN DBL1D a, QX_IN
     Codes: ErrEmptyInput (x is empty), ErrSizesDisagree (a without b, or b without a; x is
     emptied), ErrInvalidSelector (no such form; x stays as it is), ErrOutOfMemory (the host
     refuses the state), ErrCoefficientSizes (the sizes of a and b do not fit the form; x is
-    emptied). */
+    emptied).
+    NaN: x, a in all results or in some results; b in some results; state in no result. */
 QX_API int32_t IIR_Filter2(QX_INOUT DBL1D x, QX_IN const int32_t *form, QX_IN DBL1D a,
                            QX_IN DBL1D b, QX_INOUT DBL1D state, QX_IN const uint8_t *keepState,
                            QX_OUT ErrorCode *err);
@@ -79,10 +83,12 @@ QX_API int32_t CxSigIIR_Filter2(QX_INOUT CDB1D x, QX_IN const int32_t *form, QX_
     exports for arrays.
     Codes: ErrInvalidSelector (no such mode), ErrSizesDisagree (a without b; in a cascade also b
     without a), ErrOutOfMemory (the host refuses the state), ErrCoefficientSizes (the sizes of a
-    and b do not fit the cascade). A failure empties the state and leaves 0 in *x. */
+    and b do not fit the cascade). A failure empties the state and leaves 0 in *x.
+    NaN: x in some results; a, b, state in some results or in no result. */
 QX_API ErrorCode IIR_Filter_PtbyPt(QX_INOUT DBL *x, int32_t mode, QX_IN DBL1D a, QX_IN DBL1D b,
                                    QX_INOUT DBL1D state, QX_IN const uint8_t *reset);
-/** As IIR_Filter_PtbyPt, for a complex sample: its parts run through the same coefficients. */
+/** As IIR_Filter_PtbyPt, for a complex sample: its parts run through the same coefficients.
+    NaN: x.im, x.re in some results; a, b, state in some results or in no result. */
 QX_API ErrorCode CxSigIIR_Filter_PtbyPt(QX_INOUT CDB *x, int32_t mode, QX_IN DBL1D a, QX_IN DBL1D b,
                                         QX_INOUT CDB1D state, QX_IN const uint8_t *reset);
 

@@ -15,7 +15,8 @@ QX_BEGIN_DECLS
    ErrOrderNotPositive (taps is below 1), ErrOutOfMemory (the host refuses h; its status is the
    function result), ErrAboveNyquist (fl or fh is above half the sampling rate), ErrBadCutoff (a
    frequency is not above 0, or fl is not below fh), ErrBadTapCount (an even number of taps for a
-   highpass or a bandstop, whose gain at half the sampling rate is then 0). */
+   highpass or a bandstop, whose gain at half the sampling rate is then 0).
+    NaN: fs, fl in all results; fh in all results or in no result. */
 QX_API int32_t FIRCoefs(QX_IN const double *fs, QX_IN const double *fl, QX_IN const double *fh,
                         QX_IN const int32_t *taps, QX_OUT DBL1D h, QX_INOUT int32_t *type,
                         QX_OUT ErrorCode *err);
@@ -55,7 +56,8 @@ typedef QX_ARRAY_1D(RemezBand) RemezBand1D;
     edge or a desired value is negative, or the edges do not rise), ErrOutOfMemory (the host refuses
     h, whose status is then the function result; or no memory or more than about 4090 taps, then the
     function result is 2), ErrAboveNyquist (the last edge is above fs / 2), ErrBadTapCount (an even
-    n with a gain at fs / 2). */
+    n with a gain at fs / 2).
+    NaN: fs refused with ErrBadDesignField. */
 QX_API int32_t Parks(QX_IN const int32_t *n, QX_IN const double *fs, QX_IN RemezBand1D bands,
                      QX_IN const int32_t *type, QX_OUT DBL1D h, QX_OUT double *ripple,
                      QX_IN const int32_t *maxIterations, QX_OUT ErrorCode *err);
@@ -79,7 +81,9 @@ typedef struct NarrowFIRDesign {
     large that fewer than 3 taps do), ErrBadCutoff (a band about fCenter that does not lie above 0
     and below fs / 2), ErrAboveNyquist (fs is some 1e-322, so small that its half is rounded up),
     ErrOutOfMemory (no memory, a stage of more than about 4090 taps, or the host refuses an array;
-    its status is the function result). */
+    its status is the function result).
+    NaN: fs, fPass, fStop, passRipple, stopAttenuation refused with ErrBadDesignField; fCenter
+    refused with ErrBadDesignField or in no result. */
 QX_API int32_t FIRNarrowCoef_head(QX_IN const double *fs, QX_IN const double *fPass,
                                   QX_IN const double *fStop, QX_IN const double *fCenter,
                                   QX_IN const double *passRipple,
@@ -92,7 +96,8 @@ QX_API int32_t FIRNarrowCoef_head(QX_IN const double *fs, QX_IN const double *fP
     short x is.
     Codes: ErrEmptyInput (x is empty, and then y stays as it is; or the model or, for M above 1, the
     interpolator), ErrOutOfMemory (the host refuses y; its status is the function result; or no
-    memory). */
+    memory).
+    NaN: x, design.model in some results; design.interpolator in some results or in no result. */
 QX_API int32_t FIRnarrowFilter_head(QX_IN DBL1D x, QX_IN const NarrowFIRDesign *design,
                                     QX_OUT DBL1D y, QX_OUT ErrorCode *err);
 /** As FIRnarrowFilter_head, for a complex signal: its parts run through the same filter. */

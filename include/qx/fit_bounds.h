@@ -45,7 +45,9 @@ QX_BEGIN_DECLS
     three samples), ErrNonFiniteInput (an input is NaN or infinite, or later, a value, derivative or
     weighted residual of the model overflows), ErrTooFewForParameters (not more weights other than 0
     than coefficients), ErrProbabilityOutOfRange (confidence), ErrSingularMatrix (J without full
-    rank, as where all x are alike), ErrOutOfMemory (no memory, or an array cannot be resized). */
+    rank, as where all x are alike), ErrOutOfMemory (no memory, or an array cannot be resized).
+    NaN: x, y, w, coefficients refused with ErrNonFiniteInput; confidence refused with
+    ErrProbabilityOutOfRange. */
 QX_API ErrorCode ConfBndLinear_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D w,
                                     QX_IN DBL1D coefficients, double confidence,
                                     QX_OUT DBL1D lowerCoefficients, QX_OUT DBL1D upperCoefficients,
@@ -86,7 +88,9 @@ QX_API ErrorCode PredBndPower_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D w,
 
 /** As ConfBndPower_head, of y = a log(b x) to the given base; coefficients: a, b (LogFit_head). The
     base 2.71828, these six digits, means e. ErrNotStrictlyPositive means here that b x is not
-    above 0 for all x, or that the base is not above 0, or is 1. */
+    above 0 for all x, or that the base is not above 0, or is 1.
+    NaN: x, y, w, coefficients refused with ErrNonFiniteInput; base refused with
+    ErrNotStrictlyPositive; confidence refused with ErrProbabilityOutOfRange. */
 QX_API ErrorCode ConfBndLog_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D w,
                                  QX_IN DBL1D coefficients, double base, double confidence,
                                  QX_OUT DBL1D lowerCoefficients, QX_OUT DBL1D upperCoefficients,
@@ -127,7 +131,9 @@ QX_API ErrorCode PredBndPoly_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D w,
     NaN or infinite, or later, a value, derivative or weighted residual of the model overflows),
     ErrTooFewForParameters (not more weights other than 0 than coefficients),
     ErrProbabilityOutOfRange (confidence), ErrSingularMatrix (J without full rank: columns that
-    depend on each other), ErrOutOfMemory (no memory, or an array cannot be resized). */
+    depend on each other), ErrOutOfMemory (no memory, or an array cannot be resized).
+    NaN: H, y, w, coefficients refused with ErrNonFiniteInput; confidence refused with
+    ErrProbabilityOutOfRange. */
 QX_API ErrorCode ConfBndGenLS_head(QX_IN DBL2D H, QX_IN DBL1D y, QX_IN DBL1D w,
                                    QX_IN DBL1D coefficients, double confidence,
                                    QX_OUT DBL1D lowerCoefficients, QX_OUT DBL1D upperCoefficients,

@@ -19,7 +19,8 @@ QX_BEGIN_DECLS
     another shape than a), ErrInvalidSelector (order is not 0 to 4), ErrOutOfMemory (no memory),
     ErrNonFiniteInput (an element is not finite), ErrIterationLimit (the iteration did not
    converge), ErrConditionTooHigh (it failed for another reason), ErrSolverCount (rounding changed
-   the eigenvalues). */
+   the eigenvalues).
+    NaN: a, b refused with ErrNonFiniteInput. */
 QX_API ErrorCode QZ80_head(QX_INOUT DBL2D a, QX_INOUT DBL2D b, int32_t wantVectors, int32_t order,
                            QX_OUT DBL2D q, QX_OUT DBL2D z, QX_OUT CDB1D alpha, QX_OUT DBL1D beta);
 /** As QZ80_head, for complex elements: a = q s z^H and b = q t z^H with triangular s and t. */
@@ -49,7 +50,8 @@ QX_API ErrorCode CxTmiQZ_head(QX_INOUT CDB2D a, QX_INOUT CDB2D b, int32_t order,
     another shape than a), ErrInvalidSelector (output is not 0 or 1), ErrOutOfMemory (no memory),
     ErrNonFiniteInput (an element is not finite), ErrIterationLimit (the iteration did not
    converge), ErrConditionTooHigh (it failed for another reason), ErrSolverCount (rounding changed
-   the eigenvalues). */
+   the eigenvalues).
+    NaN: a, b refused with ErrNonFiniteInput. */
 QX_API ErrorCode GenEigenEx_head(QX_IN DBL2D a, QX_IN DBL2D b, int32_t output, QX_OUT CDB1D values,
                                  QX_OUT CDB2D vectors);
 /** As GenEigenEx_head, for complex elements. */
@@ -63,7 +65,8 @@ QX_API ErrorCode CxGenEigenEx_head(QX_IN CDB2D a, QX_IN CDB2D b, int32_t output,
     and b become the results of LAPACK's xGGSVD3, whose documentation tells where r stands.
     Codes: ErrEmptyInput (a or b is empty), ErrBandVectorSize (b has another number of columns than
     a), ErrOutOfMemory (no memory), ErrNonFiniteInput (an element is not finite), ErrIterationLimit
-    (the iteration did not converge). */
+    (the iteration did not converge).
+    NaN: a, b refused with ErrNonFiniteInput. */
 QX_API ErrorCode GSVD_head(QX_INOUT DBL2D a, QX_INOUT DBL2D b, QX_OUT DBL1D alpha,
                            QX_OUT DBL1D beta, QX_OUT DBL2D u, QX_OUT DBL2D v, QX_OUT DBL2D q,
                            QX_OUT int32_t *k, QX_OUT int32_t *l);

@@ -15,7 +15,8 @@ QX_BEGIN_DECLS
     centre equals its value. Where the host refuses a resize its status is the function result.
     Memory and time grow with the number of bins, 12 bytes each, however few the samples are.
     Codes: ErrEmptyInput (x is empty or there are no bins), ErrOutOfMemory (the host refused a
-    resize). */
+    resize).
+    NaN: x in no result. */
 QX_API int32_t histgran_head(QX_IN DBL1D x, QX_IN const int32_t *bins, QX_OUT I32_1D counts,
                              QX_OUT DBL1D centres, QX_OUT ErrorCode *err);
 
@@ -39,7 +40,8 @@ typedef struct HistSummary {
 /** Counts the samples of x in each of the caller's intervals, which are expected in ascending
     order. A sample counts in every interval that it lies in. After a failure the summary is 0.
     Codes: ErrSizesDisagree (the number of intervals is negative), ErrOutOfMemory (no memory),
-    ErrEmptyInput (x is empty). */
+    ErrEmptyInput (x is empty).
+    NaN: x in no result. */
 QX_API int32_t GenHistH(QX_IN DBL1D x, QX_IN HistInterval1D intervals, QX_OUT I32_1D counts,
                         QX_OUT HistSummary *summary, QX_OUT ErrorCode *err);
 

@@ -36,7 +36,9 @@ QX_BEGIN_DECLS
     ErrOutOfMemory (the host refuses an array, or no memory), ErrBadCutoff (a frequency is not above
     0, or fl is not below fh; for lowpass and highpass also a cut-off at half the sampling rate or
     above), ErrAboveNyquist (a cut-off is above half the sampling rate), ErrInvalidSelector (no such
-    type). */
+    type).
+    NaN: fs, fl in all results or in some results; fh in all results or in some results or in no
+    result. */
 QX_API int32_t BWCoefs(QX_IN const double *fs, QX_IN const double *fl, QX_IN const double *fh,
                        QX_IN const int32_t *order, QX_IN const int32_t *type, QX_OUT DBL1D a,
                        QX_OUT DBL1D b, QX_OUT ErrorCode *err);
@@ -54,7 +56,9 @@ QX_API int32_t BWCoefs90(QX_IN const double *fs, QX_IN const double *fl, QX_IN c
     ErrOutOfMemory (the host refuses an array, or no memory), ErrBadCutoff (a frequency is not above
     0, or fl is not below fh; for lowpass and highpass also a cut-off at half the sampling rate or
     above), ErrAboveNyquist (a cut-off is above half the sampling rate), ErrRippleNotPositive (the
-    ripple is not above 0), ErrInvalidSelector (no such type). */
+    ripple is not above 0), ErrInvalidSelector (no such type).
+    NaN: fs, fl, ripple in all results or in some results; fh in all results or in some results or
+    in no result. */
 QX_API int32_t ChebyshevCoefs(QX_IN const double *fs, QX_IN const double *fl,
                               QX_IN const double *fh, QX_IN const double *ripple,
                               QX_IN const int32_t *order, QX_IN const int32_t *type, QX_OUT DBL1D a,
@@ -72,7 +76,9 @@ QX_API int32_t ChebyshevCoefs90(QX_IN const double *fs, QX_IN const double *fl,
     ErrOutOfMemory (the host refuses an array, or no memory), ErrBadCutoff (a frequency is not above
     0, or fl is not below fh; for lowpass and highpass also a cut-off at half the sampling rate or
     above), ErrAttenuationNotPositive (the attenuation is not above 0), ErrAboveNyquist (a cut-off
-    is above half the sampling rate), ErrInvalidSelector (no such type). */
+    is above half the sampling rate), ErrInvalidSelector (no such type).
+    NaN: fs, fl, attenuation in all results or in some results; fh in all results or in some results
+    or in no result. */
 QX_API int32_t InvChebyshevCoefs(QX_IN const double *fs, QX_IN const double *fl,
                                  QX_IN const double *fh, QX_IN const double *attenuation,
                                  QX_IN const int32_t *order, QX_IN const int32_t *type,
@@ -93,7 +99,9 @@ QX_API int32_t InvChebyshevCoefs90(QX_IN const double *fs, QX_IN const double *f
    highpass also a cut-off at half the sampling rate or above), ErrAboveNyquist (a cut-off is above
    half the sampling rate), ErrRippleNotPositive (the ripple is not above 0),
    ErrAttenuationNotPositive (the attenuation is not above 0), ErrRippleAboveAttenuation (the ripple
-   is not below the attenuation), ErrInvalidSelector (no such type). */
+   is not below the attenuation), ErrInvalidSelector (no such type).
+    NaN: fs, fl, ripple, attenuation in all results or in some results; fh in all results or in some
+    results or in no result. */
 QX_API int32_t EllipticCoefs(QX_IN const double *fs, QX_IN const double *fl, QX_IN const double *fh,
                              QX_IN const double *ripple, QX_IN const double *attenuation,
                              QX_IN const int32_t *order, QX_IN const int32_t *type, QX_OUT DBL1D a,
@@ -114,7 +122,9 @@ QX_API int32_t EllipticCoefs90(QX_IN const double *fs, QX_IN const double *fl,
     above), ErrAboveNyquist (a cut-off is above half the sampling rate), ErrInvalidSelector (no such
     type), ErrBadCoefficients (an order of 150 or above, whose polynomial leaves the numbers),
     ErrIterationLimit (poles that are not found), ErrNonFiniteFunction (the same),
-    ErrDegenerateValue (the same). */
+    ErrDegenerateValue (the same).
+    NaN: fs, fl in all results or in some results; fh in all results or in some results or in no
+    result. */
 QX_API int32_t BesselCoefs(QX_IN const double *fs, QX_IN const double *fl, QX_IN const double *fh,
                            QX_IN const int32_t *order, QX_IN const int32_t *type, QX_OUT DBL1D a,
                            QX_OUT DBL1D b, QX_OUT ErrorCode *err);

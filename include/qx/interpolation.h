@@ -18,7 +18,8 @@ QX_BEGIN_DECLS
     correction, an estimate of the error; 0 for a single point. Of the order of n^2 / 2 steps.
     E. H. Neville, "Iterative interpolation", 1934.
     Codes: ErrSizeMismatch (x and y differ in length), ErrEmptyInput (they are empty),
-   ErrOutOfMemory (no scratch memory), ErrAbscissaeOrder (two abscissae are equal). */
+   ErrOutOfMemory (no scratch memory), ErrAbscissaeOrder (two abscissae are equal).
+    NaN: y, x, xi in all results. */
 QX_API int32_t PolyInterp_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN const double *xi,
                                QX_OUT double *yi, QX_OUT double *dy, QX_OUT ErrorCode *err);
 
@@ -36,14 +37,16 @@ QX_API int32_t RatInterp_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN const double *
    ascends or descends. A single point gives 0. Where the host refuses a resize its status is the
    function result. Codes: ErrSizeMismatch (x and y differ in length), ErrOutOfMemory (no memory),
    ErrEmptyInput (they are empty), ErrAbscissaeOrder (neighbouring abscissae, or the next but one,
-   are equal). */
+   are equal).
+    NaN: y, x in all results; firstSlope, lastSlope in no result. */
 QX_API int32_t Spline_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN const double *firstSlope,
                            QX_IN const double *lastSlope, QX_OUT DBL1D secondDerivatives,
                            QX_OUT ErrorCode *err);
 
 /** The cubic spline of Spline_head at *xi; beyond the table the end segment goes on.
     Codes: ErrSizeMismatch (the arrays differ in length, or a handle is null), ErrEmptyInput (they
-   are empty), ErrAbscissaeOrder (the abscissae around *xi are equal, or there is one only). */
+   are empty), ErrAbscissaeOrder (the abscissae around *xi are equal, or there is one only).
+    NaN: y, secondDerivatives in no result; x in all results or in no result; xi in all results. */
 QX_API int32_t SpInterp_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DBL1D secondDerivatives,
                              QX_IN const double *xi, QX_OUT double *yi, QX_OUT ErrorCode *err);
 

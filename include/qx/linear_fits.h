@@ -21,7 +21,8 @@ QX_BEGIN_DECLS
     NaN or infinities, too. Weights that are all 0 count as none.
     Codes: ErrSizeMismatch (the arrays differ in length), ErrFewerThanTwo (less than two samples),
     ErrNonFiniteInput (a weight is NaN), ErrTooFewWeights (all weights but one are 0),
-    ErrOutOfMemory (no memory where x or w is y). */
+    ErrOutOfMemory (no memory where x or w is y).
+    NaN: y, x in all results; w refused with ErrNonFiniteInput. */
 QX_API ErrorCode LinFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, QX_OUT double *slope,
                              QX_OUT double *intercept, QX_OUT double *mse);
 /** As LinFit_head, for the coefficients alone and without weights. The function result is 0 and the
@@ -32,7 +33,8 @@ QX_API int32_t LinFitCoef_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_OUT double *slop
                                QX_OUT double *intercept, QX_OUT ErrorCode *err);
 /** As LinFitCoef_head, with weights as in LinFit_head.
     Codes: ErrSizeMismatch (the arrays differ in length), ErrFewerThanTwo (less than two samples),
-    ErrNonFiniteInput (a weight is NaN), ErrTooFewWeights (all weights but one are 0). */
+    ErrNonFiniteInput (a weight is NaN), ErrTooFewWeights (all weights but one are 0).
+    NaN: y, x in all results; w refused with ErrNonFiniteInput. */
 QX_API int32_t LinFitCoef80_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, QX_OUT double *slope,
                                  QX_OUT double *intercept, QX_OUT ErrorCode *err);
 
@@ -45,7 +47,9 @@ QX_API int32_t LinFitCoef80_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, QX
     or the host refused a resize), ErrInvalidSelector (no such algorithm), ErrNonFiniteInput (a
     power of x, or with algorithm 5 a y, is not finite), ErrSingularMatrix (algorithms 1 to 5 met a
     singular system), ErrIterationLimit (the singular values do not converge),
-    WarnPolynomialOrderCapped (order is above 25). */
+    WarnPolynomialOrderCapped (order is above 25).
+    NaN: x refused with ErrNonFiniteInput or refused with ErrSingularMatrix; y refused with
+    ErrNonFiniteInput or in all results or in some results. */
 QX_API ErrorCode PolyFit_head(QX_IN DBL1D x, QX_IN DBL1D y, int32_t order, int32_t algorithm,
                               QX_OUT DBL1D fit, QX_OUT DBL1D coefficients, QX_OUT double *mse);
 /** As PolyFit_head, with coefficients that are given: that of order fixedOrders[i] is
@@ -58,7 +62,8 @@ QX_API ErrorCode PolyFit_head(QX_IN DBL1D x, QX_IN DBL1D y, int32_t order, int32
     memory, or the host refused a resize), ErrInvalidSelector (no such algorithm), ErrNonFiniteInput
     (a power of x, or with algorithm 5 a y, is not finite), ErrSingularMatrix (algorithms 1 to 5 met
     a singular system), ErrIterationLimit (the singular values do not converge), ErrEmptyInput (no
-    sample, with all coefficients given), WarnPolynomialOrderCapped (order is above 25). */
+    sample, with all coefficients given), WarnPolynomialOrderCapped (order is above 25).
+    NaN: x refused with ErrNonFiniteInput; y in some results; fixedValues in all results. */
 QX_API ErrorCode PolyFit80_head(QX_IN DBL1D x, QX_IN DBL1D y, int32_t order, int32_t algorithm,
                                 QX_IN I32_1D fixedOrders, QX_IN DBL1D fixedValues, QX_OUT DBL1D fit,
                                 QX_OUT DBL1D coefficients, QX_OUT double *mse);
@@ -70,7 +75,8 @@ QX_API ErrorCode PolyFit80_head(QX_IN DBL1D x, QX_IN DBL1D y, int32_t order, int
     (a weight or a power of x, or with algorithm 5 a y, is not finite), ErrSingularMatrix
     (algorithms 1 to 5 met a singular system), ErrIterationLimit (the singular values do not
     converge), ErrEmptyInput (no sample, with all coefficients given), WarnPolynomialOrderCapped
-    (order is above 25). */
+    (order is above 25).
+    NaN: x, w refused with ErrNonFiniteInput; y, fixedValues in some results. */
 QX_API ErrorCode PolyFit81_head(QX_IN DBL1D x, QX_IN DBL1D y, int32_t order, QX_IN DBL1D w,
                                 int32_t algorithm, QX_IN I32_1D fixedOrders,
                                 QX_IN DBL1D fixedValues, QX_OUT DBL1D fit,
@@ -90,11 +96,15 @@ QX_API ErrorCode PolyFit81_head(QX_IN DBL1D x, QX_IN DBL1D y, int32_t order, QX_
     host refused a resize), ErrOrderNotPositive (H has no columns), ErrPolynomialOrderTooHigh (less
     rows than columns), ErrInvalidSelector (no such algorithm), ErrNonFiniteInput (H or a weight, or
     with algorithm 5 a y, is not finite, where the method tests it), ErrSingularMatrix (algorithms 1
-    to 5 met a singular system), ErrIterationLimit (the singular values do not converge). */
+    to 5 met a singular system), ErrIterationLimit (the singular values do not converge).
+    NaN: H, w refused with ErrNonFiniteInput; y refused with ErrNonFiniteInput or in some
+    results. */
 QX_API ErrorCode GenLSFit80_head(QX_IN DBL2D H, QX_IN DBL1D y, QX_IN DBL1D w, int32_t algorithm,
                                  int32_t wantCovariance, QX_OUT DBL1D coefficients,
                                  QX_OUT DBL1D fit, QX_OUT DBL2D covariance, QX_OUT double *mse);
-/** As GenLSFit80_head, with standard deviations: the weights are 1 / sd^2, and 1 where sd is 0. */
+/** As GenLSFit80_head, with standard deviations: the weights are 1 / sd^2, and 1 where sd is 0.
+    NaN: H, deviations refused with ErrNonFiniteInput or refused with ErrSingularMatrix; y refused
+    with ErrNonFiniteInput or in all results or in some results. */
 QX_API ErrorCode GenLSFit_head(QX_IN DBL2D H, QX_IN DBL1D y, QX_IN DBL1D deviations,
                                int32_t algorithm, int32_t wantCovariance, QX_OUT DBL1D coefficients,
                                QX_OUT DBL1D fit, QX_OUT DBL2D covariance, QX_OUT double *mse);
@@ -107,7 +117,8 @@ QX_API ErrorCode GenLSFit_head(QX_IN DBL2D H, QX_IN DBL1D y, QX_IN DBL1D deviati
     for a fit without residuals, *rmse is NaN. From 1e154 on y and fit overflow: all three are
     infinite or NaN.
     Codes: ErrEmptyInput (y is empty), ErrSizeMismatch (the arrays differ in length),
-    ErrFewerThanTwo (one sample), ErrTooFewForParameters (not more samples than dof). */
+    ErrFewerThanTwo (one sample), ErrTooFewForParameters (not more samples than dof).
+    NaN: y, fit, w in all results. */
 QX_API ErrorCode GoodnessOfFit_head(QX_IN DBL1D y, QX_IN DBL1D fit, QX_IN DBL1D w, int32_t dof,
                                     QX_OUT double *sse, QX_OUT double *rSquare,
                                     QX_OUT double *rmse);
@@ -117,7 +128,9 @@ QX_API ErrorCode GoodnessOfFit_head(QX_IN DBL1D y, QX_IN DBL1D fit, QX_IN DBL1D 
     coefficient infinite, with the code 0. The code stands in *err and is the function result, too.
     Codes: ErrEmptyInput (the sizes are 0 or disagree), ErrOutOfMemory (no memory),
     ErrNonFiniteInput (a diagonal element is not finite), ErrSingularMatrix (the system is singular,
-    or a new coefficient is NaN). */
+    or a new coefficient is NaN).
+    NaN: coefficients, gradient refused with ErrSingularMatrix; a refused with ErrNonFiniteInput or
+    refused with ErrSingularMatrix; lambda refused with ErrNonFiniteInput. */
 QX_API ErrorCode GetNewCoef_head(QX_INOUT DBL1D coefficients, QX_IN DBL2D a, QX_IN DBL1D gradient,
                                  QX_IN const double *lambda, QX_OUT ErrorCode *err);
 

@@ -16,7 +16,8 @@ QX_BEGIN_DECLS
     the host's own status as the function result. Non-finite data are not looked for.
     Codes: ErrSizeMismatch (b has not as many elements as a has rows), ErrNotSquare (a is not
     square), ErrEmptyInput (a and b are empty), ErrOutOfMemory (no memory, or the host refused the
-    resize), ErrSingularMatrix (a column has no pivot but 0). */
+    resize), ErrSingularMatrix (a column has no pivot but 0).
+    NaN: a refused with ErrSingularMatrix; b in all results. */
 QX_API int32_t EqsByLUDri_head(QX_IN DBL2D a, QX_IN DBL1D b, QX_OUT DBL1D x, QX_OUT ErrorCode *err);
 /** As EqsByLUDri_head, for complex data. */
 QX_API int32_t CxEqsByLUDri_head(QX_IN CDB2D a, QX_IN CDB1D b, QX_OUT CDB1D x,
@@ -35,7 +36,8 @@ QX_API ErrorCode CxEqsSetByLUDri_head(QX_IN CDB2D a, QX_IN CDB2D b, QX_OUT CDB2D
     infinities or NaN.
     Codes: ErrSizeMismatch (pivots or b has not as many elements as lu has rows), ErrNotSquare (lu
     is not square), ErrEmptyInput (lu, pivots and b are empty), ErrIndexOutOfRange (a
-    pivot is no row of lu). */
+    pivot is no row of lu).
+    NaN: lu in all results or in some results; b in all results. */
 QX_API int32_t LULinEqs_head(QX_IN DBL2D lu, QX_IN I32_1D pivots, QX_INOUT DBL1D b,
                              QX_OUT ErrorCode *err);
 /** As LULinEqs_head, for complex data. */
@@ -44,7 +46,8 @@ QX_API int32_t CxLULinEqs_head(QX_IN CDB2D lu, QX_IN I32_1D pivots, QX_INOUT CDB
 
 /** Inverse by LU factorisation, in place of a.
     Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory),
-    ErrSingularMatrix (a column has no pivot but 0). */
+    ErrSingularMatrix (a column has no pivot but 0).
+    NaN: a refused with ErrSingularMatrix. */
 QX_API int32_t InvMatrixLUDri_head(QX_INOUT DBL2D a, QX_OUT ErrorCode *err);
 /** As InvMatrixLUDri_head, for complex data. */
 QX_API int32_t CxInvMatrixLUDri_head(QX_INOUT CDB2D a, QX_OUT ErrorCode *err);
@@ -53,7 +56,8 @@ QX_API int32_t CxInvMatrixLUDri_head(QX_INOUT CDB2D a, QX_OUT ErrorCode *err);
     gives infinities or NaN.
     Codes: ErrSizeMismatch (pivots has not as many elements as lu has rows), ErrNotSquare (lu is
     not square), ErrEmptyInput (lu and pivots are empty), ErrOutOfMemory (no memory),
-    ErrIndexOutOfRange (a pivot is no row of lu). */
+    ErrIndexOutOfRange (a pivot is no row of lu).
+    NaN: lu in all results or in some results. */
 QX_API int32_t LUInvMatrix_head(QX_INOUT DBL2D lu, QX_IN I32_1D pivots, QX_OUT ErrorCode *err);
 /** As LUInvMatrix_head, for complex data. */
 QX_API int32_t CxLUInvMatrix_head(QX_INOUT CDB2D lu, QX_IN I32_1D pivots, QX_OUT ErrorCode *err);
@@ -67,14 +71,16 @@ QX_API int32_t CxLUInvMatrix_head(QX_INOUT CDB2D lu, QX_IN I32_1D pivots, QX_OUT
     Codes: ErrSizeMismatch (b has not as many elements as a has rows), ErrEmptyInput (a has no
     column, or a and b are empty), ErrOutOfMemory (no memory, or the host refused the resize),
     ErrNonFiniteInput (a or b holds NaN or infinity), ErrIterationLimit (the singular values do not
-    converge). */
+    converge).
+    NaN: a, b refused with ErrNonFiniteInput. */
 QX_API int32_t GenLinEqs_head(QX_IN DBL2D a, QX_IN DBL1D b, QX_OUT DBL1D x, QX_OUT ErrorCode *err);
 /** As GenLinEqs_head, for complex data. */
 QX_API int32_t CxGenLinEqs_head(QX_IN CDB2D a, QX_IN CDB1D b, QX_OUT CDB1D x,
                                 QX_OUT ErrorCode *err);
 
 /** As GenLinEqs_head, with the tolerance in place of 2.2e-16, which one of 0 or below still
-    selects, and 0 as the function result even where the host refuses a resize. */
+    selects, and 0 as the function result even where the host refuses a resize.
+    NaN: a, b refused with ErrNonFiniteInput; tolerance in no result. */
 QX_API int32_t GenLinEqs82_head(QX_IN DBL2D a, QX_IN DBL1D b, QX_OUT DBL1D x, double tolerance,
                                 QX_OUT ErrorCode *err);
 /** As GenLinEqs82_head, for complex data. */
@@ -87,7 +93,8 @@ QX_API int32_t CxGenLinEqs82_head(QX_IN CDB2D a, QX_IN CDB1D b, QX_OUT CDB1D x, 
     (n by k) of a, scaled by the inverse singular values.
     Codes: ErrEmptyInput (a or b is empty), ErrSizeMismatch (b has not as many elements as a has
     rows), ErrOutOfMemory (no memory, or the host refused a resize), ErrNonFiniteInput (a or b holds
-    NaN or infinity), ErrIterationLimit (the singular values do not converge). */
+    NaN or infinity), ErrIterationLimit (the singular values do not converge).
+    NaN: a, b refused with ErrNonFiniteInput; tolerance in no result. */
 QX_API ErrorCode GenLinEqs2010_head(QX_IN DBL2D a, QX_IN DBL1D b, QX_OUT DBL1D x, double tolerance,
                                     QX_OUT DBL1D work);
 
@@ -107,13 +114,15 @@ QX_API ErrorCode GenLinEqsbySVD2011_head(QX_IN DBL2D a, QX_IN DBL1D b, QX_OUT DB
     Codes: ErrEmptyInput (a or b is empty), ErrSizeMismatch (b has not as many rows as a),
     ErrOutOfMemory (no memory, or the host refused the resize), ErrNonFiniteInput (a or b holds NaN
     or infinity), ErrIterationLimit (the singular values do not converge), WarnRankDeficient
-    (singular values count as 0; x is valid). */
+    (singular values count as 0; x is valid).
+    NaN: a, b refused with ErrNonFiniteInput. */
 QX_API ErrorCode EqsSetBySVDDri_head(QX_IN DBL2D a, QX_IN DBL2D b, QX_OUT DBL2D x);
 /** As EqsSetBySVDDri_head, for complex data. */
 QX_API ErrorCode CxEqsSetBySVDDri_head(QX_IN CDB2D a, QX_IN CDB2D b, QX_OUT CDB2D x);
 
 /** As EqsSetBySVDDri_head, with the tolerance in place of 2.2e-16, which one of 0 or below still
-    selects. */
+    selects.
+    NaN: a, b refused with ErrNonFiniteInput; tolerance in no result. */
 QX_API ErrorCode EqsSetBySVDDri82_head(QX_IN DBL2D a, QX_IN DBL2D b, QX_OUT DBL2D x,
                                        double tolerance);
 /** As EqsSetBySVDDri82_head, for complex data. */
@@ -125,7 +134,8 @@ QX_API ErrorCode CxEqsSetBySVDDri82_head(QX_IN CDB2D a, QX_IN CDB2D b, QX_OUT CD
     Codes: ErrSizeMismatch (b has not as many elements as a has rows), ErrNotSquare (a is not
     square), ErrEmptyInput (a and b are empty), ErrOutOfMemory (no memory, or the host refused the
     resize), ErrNonFiniteInput (a or b holds NaN or infinity), ErrNotPositiveDefinite (a is not
-    positive definite, or nearly not). */
+    positive definite, or nearly not).
+    NaN: a, b refused with ErrNonFiniteInput. */
 QX_API int32_t EqsByCholeskyDri_head(QX_IN DBL2D a, QX_IN DBL1D b, QX_OUT DBL1D x,
                                      QX_OUT ErrorCode *err);
 /** As EqsByCholeskyDri_head, for a Hermitian matrix. */
@@ -146,7 +156,8 @@ QX_API ErrorCode CxEqsSetByCholeskyDri_head(QX_IN CDB2D a, int32_t useUpper, QX_
 
 /** Solves L L^T x = b in place of b with a packed lower factor of Cholesky_head.
     Codes: ErrNotSquare (the length of packedFactor is no n (n+1) / 2), ErrSizeMismatch (b has not n
-    elements), ErrEmptyInput (packedFactor and b are empty). */
+    elements), ErrEmptyInput (packedFactor and b are empty).
+    NaN: packedFactor, b in all results. */
 QX_API int32_t CholeskyLinEqs_head(QX_IN DBL1D packedFactor, QX_INOUT DBL1D b,
                                    QX_OUT ErrorCode *err);
 /** As CholeskyLinEqs_head, for complex data: L L^H x = b. */
@@ -159,7 +170,8 @@ QX_API int32_t CxCholeskyLinEqs_head(QX_IN CDB1D packedFactor, QX_INOUT CDB1D b,
     not as many rows as a), ErrInvalidSelector (triangle is neither 0 nor 1), ErrOutOfMemory (no
     memory, or the host refused the resize), ErrNonFiniteInput (the triangle or b holds NaN or
     infinity), ErrSingularMatrix (the modulus of a diagonal element is not above 2.2e-16 times the
-    largest modulus of the triangle). */
+    largest modulus of the triangle).
+    NaN: a refused with ErrNonFiniteInput or in no result; b refused with ErrNonFiniteInput. */
 QX_API ErrorCode TriEqsSetDri_head(QX_IN DBL2D a, int32_t triangle, QX_IN DBL2D b, QX_OUT DBL2D x);
 /** As TriEqsSetDri_head, for complex data. */
 QX_API ErrorCode CxTriEqsSetDri_head(QX_IN CDB2D a, int32_t triangle, QX_IN CDB2D b,
@@ -168,7 +180,8 @@ QX_API ErrorCode CxTriEqsSetDri_head(QX_IN CDB2D a, int32_t triangle, QX_IN CDB2
 /** As TriEqsSetDri_head, for a packed triangle and in place of b, with the code in *err.
     Codes: ErrInvalidSelector (triangle is neither 0 nor 1), ErrNotSquare (the length of a is no n
     (n+1) / 2), ErrSizeMismatch (b has not n elements), ErrEmptyInput (a and b are empty),
-    ErrNonFiniteInput (a or b holds NaN or infinity), ErrSingularMatrix (as there). */
+    ErrNonFiniteInput (a or b holds NaN or infinity), ErrSingularMatrix (as there).
+    NaN: a.packed, b refused with ErrNonFiniteInput. */
 QX_API int32_t TriLinEqs_head(QX_IN const PackedTriangle *a, QX_INOUT DBL1D b,
                               QX_OUT ErrorCode *err);
 /** As TriLinEqs_head, for complex data. */
@@ -180,14 +193,16 @@ QX_API int32_t CxTriLinEqs_head(QX_IN const CxPackedTriangle *a, QX_INOUT CDB1D 
     Codes: ErrSizesDisagree (band has not lowerBands + upperBands + 1 rows), ErrBandVectorSize (b
     has not as many elements as band has columns), ErrEmptyInput (band, or a matrix b, has no
     column), ErrSizesDisagree (a count of bands is below 0, or lowerBands + upperBands + 1 is above
-    the order), ErrOutOfMemory (no memory), ErrSingularMatrix (a pivot is 0). */
+    the order), ErrOutOfMemory (no memory), ErrSingularMatrix (a pivot is 0).
+    NaN: band in all results or in no result; b in all results. */
 QX_API ErrorCode BandEqsDriH(QX_IN DBL2D band, QX_INOUT DBL1D b, int32_t lowerBands,
                              int32_t upperBands);
 /** As BandEqsDriH, for complex data. */
 QX_API ErrorCode CxBandEqsDriH(QX_IN CDB2D band, QX_INOUT CDB1D b, int32_t lowerBands,
                                int32_t upperBands);
 
-/** As BandEqsDriH, for all columns of b. */
+/** As BandEqsDriH, for all columns of b.
+    NaN: band in all results or in no result; b in some results. */
 QX_API ErrorCode BandEqsSetDriH(QX_IN DBL2D band, QX_INOUT DBL2D b, int32_t lowerBands,
                                 int32_t upperBands);
 /** As BandEqsSetDriH, for complex data. */
@@ -199,7 +214,8 @@ QX_API ErrorCode CxBandEqsSetDriH(QX_IN CDB2D band, QX_INOUT CDB2D b, int32_t lo
     the row (counted from 1) that step i was exchanged with.
     Codes: ErrFewerThanThree (diag has fewer than 3 elements), ErrSizesDisagree (lower or upper has
     not n - 1 elements), ErrOutOfMemory (no memory, or the host refused a resize), WarnSingular (a
-    pivot is 0; the factors are complete but solve nothing). */
+    pivot is 0; the factors are complete but solve nothing).
+    NaN: lower, diag, upper in some results. */
 QX_API ErrorCode TriDiagLU_head(QX_INOUT DBL1D lower, QX_INOUT DBL1D diag, QX_INOUT DBL1D upper,
                                 QX_OUT DBL1D upper2, QX_OUT I32_1D pivots);
 
@@ -207,12 +223,14 @@ QX_API ErrorCode TriDiagLU_head(QX_INOUT DBL1D lower, QX_INOUT DBL1D diag, QX_IN
     `transposed` is not 0. A pivot of 0 gives infinities or NaN.
     Codes: ErrFewerThanThree (diag has fewer than 3 elements), ErrSizesDisagree (a factor or b has
     not the size that belongs to diag), ErrOutOfMemory (no memory), ErrIndexOutOfRange (pivots
-    holds another row than i or i + 1 at step i). */
+    holds another row than i or i + 1 at step i).
+    NaN: lower, diag, upper, upper2 in all results or in some results; b in all results. */
 QX_API ErrorCode TriDiagEqsByLU_head(int32_t transposed, QX_IN DBL1D lower, QX_IN DBL1D diag,
                                      QX_IN DBL1D upper, QX_IN DBL1D upper2, QX_IN I32_1D pivots,
                                      QX_INOUT DBL1D b);
 
-/** As TriDiagEqsByLU_head, for all columns of b. */
+/** As TriDiagEqsByLU_head, for all columns of b.
+    NaN: lower, diag, upper, upper2 in all results or in some results; b in some results. */
 QX_API ErrorCode TriDiagEqsSetByLU_head(int32_t transposed, QX_IN DBL1D lower, QX_IN DBL1D diag,
                                         QX_IN DBL1D upper, QX_IN DBL1D upper2, QX_IN I32_1D pivots,
                                         QX_INOUT DBL2D b);

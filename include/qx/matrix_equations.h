@@ -29,7 +29,8 @@ QX_BEGIN_DECLS
     ErrIterationLimit (the iteration for a Schur form does not converge), ErrSingularMatrix (for
     eigenvalues l of a and m of b |l + m|, in equation 1 |l - m|, is at most eps (|a| + |b|), or in
     equation 2 |l m - 1| at most eps (|a| |b| + 1), with Frobenius norms), ErrOverflow (an element
-    of x is too large), ErrOutOfMemory (no memory). */
+    of x is too large), ErrOutOfMemory (no memory).
+    NaN: a, b, c refused with ErrNonFiniteInput. */
 QX_API ErrorCode Sylvester2011_head(QX_IN DBL2D a, QX_IN DBL2D b, QX_IN DBL2D c, int32_t equation,
                                     QX_OUT DBL2D x);
 /** As Sylvester2011_head, for complex elements. */
@@ -49,7 +50,8 @@ QX_API ErrorCode CxSylvester_head(QX_IN CDB2D a, QX_IN CDB2D b, QX_IN CDB2D c, Q
     ErrIterationLimit (the iteration for the Schur form does not converge), ErrSingularMatrix (for
     eigenvalues l and m of a, which may be the same, |l + conj(m)| is at most 2 eps |a|, or in
     equation 1 |l conj(m) - 1| at most eps (|a|^2 + 1), with the Frobenius norm), ErrOverflow (an
-    element of x is too large), ErrOutOfMemory (no memory). */
+    element of x is too large), ErrOutOfMemory (no memory).
+    NaN: a, q refused with ErrNonFiniteInput. */
 QX_API ErrorCode Lyapunov2011_head(QX_IN DBL2D a, QX_IN DBL2D q, int32_t equation, QX_OUT DBL2D x);
 /** As Lyapunov2011_head, for complex elements. */
 QX_API ErrorCode CxLyapunov2011_head(QX_IN CDB2D a, QX_IN CDB2D q, int32_t equation,

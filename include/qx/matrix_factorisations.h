@@ -16,7 +16,8 @@ QX_BEGIN_DECLS
     pivots, of m elements, are row numbers: in step k row k was exchanged with row pivots[k].
     *parity is 1 for an odd number of exchanges, else 0. A singular matrix keeps its factors.
     Codes: ErrEmptyInput (a is empty), ErrOutOfMemory (no memory), WarnSingular (U has a zero on its
-    diagonal). */
+    diagonal).
+    NaN: a in some results. */
 QX_API int32_t LU_head(QX_INOUT DBL2D a, QX_OUT I32_1D pivots, QX_OUT int32_t *parity,
                        QX_OUT ErrorCode *err);
 /** As LU_head, for complex elements. */
@@ -27,7 +28,8 @@ QX_API int32_t CxLU_head(QX_INOUT CDB2D a, QX_OUT I32_1D pivots, QX_OUT int32_t 
     in packed storage: column after column, column j with rows j to n-1. Near singularity counts as
     failure, too: a diagonal element of L below 1.5e-8 of the largest element of L.
     Codes: ErrEmptyInput (packed is empty), ErrNotSquare (the length is no n(n+1)/2),
-    ErrNotPositiveDefinite (a is not positive definite, or nearly singular). */
+    ErrNotPositiveDefinite (a is not positive definite, or nearly singular).
+    NaN: packed refused with ErrNotPositiveDefinite. */
 QX_API int32_t Cholesky_head(QX_INOUT DBL1D packed, QX_OUT ErrorCode *err);
 /** As Cholesky_head, for a Hermitian a = L L^H, of whose diagonal the real parts count. */
 QX_API int32_t CxCholesky_head(QX_INOUT CDB1D packed, QX_OUT ErrorCode *err);
@@ -35,14 +37,16 @@ QX_API int32_t CxCholesky_head(QX_INOUT CDB1D packed, QX_OUT ErrorCode *err);
 /** The factor of Cholesky_head in place of a square matrix: read from the lower triangle, and
     written there with zeros above.
     Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory),
-    ErrNotPositiveDefinite (a is not positive definite, or nearly singular). */
+    ErrNotPositiveDefinite (a is not positive definite, or nearly singular).
+    NaN: a refused with ErrNotPositiveDefinite. */
 QX_API int32_t FullCholesky_head(QX_INOUT DBL2D a, QX_OUT ErrorCode *err);
 /** As FullCholesky_head, for a Hermitian matrix. */
 QX_API int32_t CxFullCholesky_head(QX_INOUT CDB2D a, QX_OUT ErrorCode *err);
 
 /** The inverse of L L^T, as a packed lower triangle in place of the factor of Cholesky_head.
     Codes: ErrEmptyInput (packedFactor is empty), ErrNotSquare (the length is no n(n+1)/2),
-    ErrSingularMatrix (a diagonal element is 0). */
+    ErrSingularMatrix (a diagonal element is 0).
+    NaN: packedFactor in all results or in some results. */
 QX_API int32_t Cholesky_InvMatrix_head(QX_INOUT DBL1D packedFactor, QX_OUT ErrorCode *err);
 /** As Cholesky_InvMatrix_head, for L L^H. */
 QX_API int32_t CxCholesky_InvMatrix_head(QX_INOUT CDB1D packedFactor, QX_OUT ErrorCode *err);
@@ -50,7 +54,8 @@ QX_API int32_t CxCholesky_InvMatrix_head(QX_INOUT CDB1D packedFactor, QX_OUT Err
 /** The inverse of a symmetric positive definite matrix in its place. Only the lower triangle is
     read; both are written.
     Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory),
-    ErrNotPositiveDefinite (a is not positive definite, or nearly singular). */
+    ErrNotPositiveDefinite (a is not positive definite, or nearly singular).
+    NaN: a refused with ErrNotPositiveDefinite. */
 QX_API int32_t InvMatrixChoDri_head(QX_INOUT DBL2D a, QX_OUT ErrorCode *err);
 /** As InvMatrixChoDri_head, for a Hermitian matrix. */
 QX_API int32_t CxInvMatrixChoDri_head(QX_INOUT CDB2D a, QX_OUT ErrorCode *err);
@@ -58,7 +63,8 @@ QX_API int32_t CxInvMatrixChoDri_head(QX_INOUT CDB2D a, QX_OUT ErrorCode *err);
 /** As InvMatrixChoDri_head, without a request for memory: packedWork, of at least n(n+1)/2
     elements, is the work space. It is neither resized nor emptied.
     Codes: ErrSizeMismatch (packedWork is too short), ErrNotSquare (a is not square), ErrEmptyInput
-    (a is empty), ErrNotPositiveDefinite (a is not positive definite, or nearly singular). */
+    (a is empty), ErrNotPositiveDefinite (a is not positive definite, or nearly singular).
+    NaN: a refused with ErrNotPositiveDefinite; packedWork in no result. */
 QX_API int32_t PreallocInvMatrixChoDri_H(QX_INOUT DBL2D a, QX_INOUT DBL1D packedWork,
                                          QX_OUT ErrorCode *err);
 
@@ -77,7 +83,8 @@ typedef struct CxPackedTriangle {
     Codes: ErrInvalidSelector (triangle is not 0 or 1), ErrEmptyInput (packed is empty),
     ErrNotSquare (the length is no n(n+1)/2), ErrNonFiniteInput (an element is not finite),
     ErrSingularMatrix (a diagonal element is at most 2.2e-16 of the largest element in absolute
-    value). */
+    value).
+    NaN: a.packed refused with ErrNonFiniteInput. */
 QX_API int32_t Tri_InvMatrix_head(QX_INOUT PackedTriangle *a, QX_OUT ErrorCode *err);
 /** As Tri_InvMatrix_head, for complex elements. */
 QX_API int32_t CxTri_InvMatrix_head(QX_INOUT CxPackedTriangle *a, QX_OUT ErrorCode *err);
@@ -86,7 +93,8 @@ QX_API int32_t CxTri_InvMatrix_head(QX_INOUT CxPackedTriangle *a, QX_OUT ErrorCo
    is not read; it becomes 0. Codes: ErrInvalidSelector (*triangle is not 0 or 1), ErrNotSquare
    (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory), ErrNonFiniteInput (an
    element is not finite), ErrSingularMatrix (a diagonal element is at most 2.2e-16 of the largest
-   element in absolute value). */
+   element in absolute value).
+    NaN: a refused with ErrNonFiniteInput. */
 QX_API int32_t InvMatrixTriDri_head(QX_INOUT DBL2D a, QX_IN const int32_t *triangle,
                                     QX_OUT ErrorCode *err);
 /** As InvMatrixTriDri_head, for complex elements. */
@@ -101,7 +109,8 @@ QX_API int32_t CxInvMatrixTriDri_head(QX_INOUT CDB2D a, QX_IN const int32_t *tri
    q r small to a few m eps, however ill-conditioned a is. L. Giraud, J. Langou, M. Rozloznik, "On
    the loss of orthogonality in the Gram-Schmidt orthogonalization process", 2005. Codes:
    ErrInvalidSelector (*algorithm is not 0, 1 or 2), ErrEmptyInput (a is empty), ErrOutOfMemory (no
-   memory), ErrNonFiniteInput (an element is not finite). */
+   memory), ErrNonFiniteInput (an element is not finite).
+    NaN: a refused with ErrNonFiniteInput. */
 QX_API int32_t qrd_head(QX_IN DBL2D a, QX_IN const int32_t *algorithm, QX_OUT DBL2D q,
                         QX_OUT DBL2D r, QX_OUT ErrorCode *err);
 /** As qrd_head, for complex elements; the diagonal of r is real. */
@@ -114,7 +123,8 @@ QX_API int32_t Cxqrd_head(QX_IN CDB2D a, QX_IN const int32_t *algorithm, QX_OUT 
    is n by n with a single 1 in each row and column, and each step takes the longest remaining
    column, so that the diagonal of r falls in absolute value (P. Businger and G. H. Golub, 1965).
     Codes: ErrEmptyInput (a is empty), ErrInvalidSelector (economy is not 0, 1 or 2), ErrOutOfMemory
-    (no memory), ErrNonFiniteInput (an element is not finite). */
+    (no memory), ErrNonFiniteInput (an element is not finite).
+    NaN: a refused with ErrNonFiniteInput. */
 QX_API ErrorCode QRDecH(QX_IN DBL2D a, int32_t pivoting, int32_t economy, QX_OUT I32_2D permutation,
                         QX_OUT DBL2D q, QX_OUT DBL2D r);
 /** As QRDecH, for complex elements; the diagonal of r is real. */
@@ -131,7 +141,8 @@ QX_API ErrorCode CxQRDecH(QX_IN CDB2D a, int32_t pivoting, int32_t economy,
     up first, and so for every export that stands on this decomposition. A value that overflows is
     infinite.
     Codes: ErrEmptyInput (a is empty), ErrOutOfMemory (no memory), ErrNonFiniteInput (an element is
-    not finite), ErrIterationLimit (100 iterations were not enough for a value). */
+    not finite), ErrIterationLimit (100 iterations were not enough for a value).
+    NaN: a refused with ErrNonFiniteInput. */
 QX_API int32_t SVD_head(QX_INOUT DBL2D a, QX_OUT DBL1D s, QX_OUT DBL2D v, QX_OUT ErrorCode *err);
 /** As SVD_head, for complex elements: a = u diag(s) v^H. */
 QX_API int32_t CxSVD_head(QX_INOUT CDB2D a, QX_OUT DBL1D s, QX_OUT CDB2D v, QX_OUT ErrorCode *err);
@@ -153,7 +164,8 @@ QX_API int32_t CxSVDS_head(QX_IN CDB2D a, QX_OUT DBL1D s, QX_OUT ErrorCode *err)
     zero below the first subdiagonal. Rows and columns low to high, counted from 1 as
     MatrixBalance_head gives them, are reduced; a must be upper triangular outside of them.
     Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrIndexOutOfRange (not 1 <=
-    low <= high <= n), ErrOutOfMemory (no memory), ErrNonFiniteInput (an element is not finite). */
+    low <= high <= n), ErrOutOfMemory (no memory), ErrNonFiniteInput (an element is not finite).
+    NaN: a refused with ErrNonFiniteInput. */
 QX_API ErrorCode Hessenberg_head(QX_INOUT DBL2D a, int32_t low, int32_t high, QX_OUT DBL2D q);
 /** As Hessenberg_head, for complex elements: h = q^H a q. */
 QX_API ErrorCode CxHessenberg_head(QX_INOUT CDB2D a, int32_t low, int32_t high, QX_OUT CDB2D q);
@@ -167,7 +179,8 @@ QX_API ErrorCode CxHessenberg_head(QX_INOUT CDB2D a, int32_t low, int32_t high, 
    those from 1 to low - 1. B. N. Parlett and C. Reinsch, "Balancing a matrix for calculation of
    eigenvalues and eigenvectors", 1969. Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not
    square), ErrInvalidSelector (job is not 0 to 3), ErrOutOfMemory (no memory), ErrNonFiniteInput
-   (an element is not finite). */
+   (an element is not finite).
+    NaN: a refused with ErrNonFiniteInput. */
 QX_API ErrorCode MatrixBalance_head(QX_INOUT DBL2D a, int32_t job, QX_OUT int32_t *low,
                                     QX_OUT int32_t *high, QX_OUT DBL1D scale);
 /** As MatrixBalance_head, for complex elements, whose size is taken as |re| + |im|. */
@@ -179,7 +192,8 @@ QX_API ErrorCode CxMatrixBalance_head(QX_INOUT CDB2D a, int32_t job, QX_OUT int3
     MatrixBalance_head. side: 0 right eigenvectors; 1 left ones. The vectors are not scaled to unit
    length. Codes: ErrEmptyInput (v or scale is empty), ErrInvalidSelector (job is not 0 to 3, or
    side not 0 or 1), ErrSizeMismatch (scale has another length than v has rows), ErrIndexOutOfRange
-   (not 1 <= low <= high <= n, or an exchange is with no row of v), ErrOutOfMemory (no memory). */
+   (not 1 <= low <= high <= n, or an exchange is with no row of v), ErrOutOfMemory (no memory).
+    NaN: scale refused with ErrIndexOutOfRange or in some results; v in some results. */
 QX_API ErrorCode EigenVBack_head(int32_t job, int32_t side, int32_t low, int32_t high,
                                  QX_IN DBL1D scale, QX_INOUT DBL2D v);
 /** As EigenVBack_head, for complex vectors. */

@@ -21,7 +21,8 @@ QX_BEGIN_DECLS
     Elements that overflow, and what is computed from them, are infinite or NaN. C. Moler and C. Van
     Loan, "Nineteen dubious ways to compute the exponential of a matrix", 1978.
     Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory),
-    ErrNonFiniteInput (an element, or the norm, is not finite, unless a is diagonal). */
+    ErrNonFiniteInput (an element, or the norm, is not finite, unless a is diagonal).
+    NaN: a refused with ErrNonFiniteInput. */
 QX_API int32_t MatrixExp_head(QX_INOUT DBL2D a, QX_OUT ErrorCode *err);
 /** As MatrixExp_head, for complex elements. */
 QX_API int32_t CxMatrixExp_head(QX_INOUT CDB2D a, QX_OUT ErrorCode *err);
@@ -40,7 +41,8 @@ QX_API int32_t CxMatrixExp_head(QX_INOUT CDB2D a, QX_OUT ErrorCode *err);
     has no inverse), ErrConditionTooHigh (the eigenvectors of a, slightly changed, are dependent),
     ErrIterationLimit (the eigenvalue iteration did not converge), WarnSingular (a is singular, and
     the series gave a result all the same), WarnLowAccuracy (the best that was found is off by more
-    than 1e-12). */
+    than 1e-12).
+    NaN: a refused with ErrNonFiniteInput. */
 QX_API int32_t MatrixLn_head(QX_IN DBL2D a, QX_OUT CDB2D out, QX_OUT ErrorCode *err);
 /** As MatrixLn_head, for complex elements and in place. */
 QX_API int32_t CxMatrixLn_head(QX_INOUT CDB2D a, QX_OUT ErrorCode *err);
@@ -53,7 +55,8 @@ QX_API int32_t CxMatrixLn_head(QX_INOUT CDB2D a, QX_OUT ErrorCode *err);
     Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory),
     ErrNonFiniteInput (an element, or an eigenvalue, is not finite), ErrIterationLimit (the
     eigenvalue iteration did not converge), ErrConditionTooHigh (the eigenvalues could not be
-    ordered), WarnLowAccuracy (two or more eigenvalues are below 1e-12: there may be no root). */
+    ordered), WarnLowAccuracy (two or more eigenvalues are below 1e-12: there may be no root).
+    NaN: a refused with ErrNonFiniteInput. */
 QX_API int32_t MatrixSqrt_head(QX_INOUT DBL2D a, QX_OUT ErrorCode *err);
 /** As MatrixSqrt_head, with the whole complex root in `out`; the code is the function result.
     Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory),
@@ -70,7 +73,8 @@ QX_API int32_t CxMatrixSqrt_head(QX_INOUT CDB2D a, QX_OUT ErrorCode *err);
     computed from them, are infinite or NaN.
     Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory),
     ErrNonFiniteInput (power is negative and an element not finite), ErrIterationLimit (the singular
-    value iteration did not converge). */
+    value iteration did not converge).
+    NaN: a refused with ErrNonFiniteInput or in all results or in no result. */
 QX_API ErrorCode MatrixPower_head(QX_INOUT DBL2D a, int32_t power);
 /** As MatrixPower_head, for complex elements. */
 QX_API ErrorCode CxMatrixPower_head(QX_INOUT CDB2D a, int32_t power);
@@ -83,7 +87,8 @@ QX_API ErrorCode CxMatrixPower_head(QX_INOUT CDB2D a, int32_t power);
     1e-4, 2e-5 at 1e-8 and 0.2 at 1e-12; scale a up. Where 1/s overflows, elements are infinite or
     NaN.
     Codes: ErrEmptyInput (a is empty), ErrOutOfMemory (no memory), ErrNonFiniteInput (an element is
-    not finite), ErrIterationLimit (the singular value iteration did not converge). */
+    not finite), ErrIterationLimit (the singular value iteration did not converge).
+    NaN: a refused with ErrNonFiniteInput; tolerance in no result. */
 QX_API int32_t PseudoInverse_head(QX_INOUT DBL2D a, QX_IN const double *tolerance,
                                   QX_OUT ErrorCode *err);
 /** As PseudoInverse_head, for complex elements. */

@@ -19,7 +19,8 @@ QX_BEGIN_DECLS
     ascending order of p, each rounded once as a product and once in the sum.
     Codes: ErrInnerDimensionMismatch (a has not as many columns as b has rows),
     ErrNegativeDimension (a size is below 0), ErrOutOfMemory (no memory, or the host refused the
-    resize). */
+    resize).
+    NaN: a, b in some results. */
 QX_API int32_t MatrixMulAligned_head(QX_IN DBL2D a, QX_IN DBL2D b, QX_OUT DBL2D c,
                                      int32_t alignedCopy, QX_OUT ErrorCode *err);
 /** As MatrixMulAligned_head, with alignedCopy 0. */
@@ -33,7 +34,8 @@ QX_API int32_t AxBCxCIN(QX_IN CDB2D a, QX_IN CDB2D b, QX_OUT CDB2D c, QX_OUT Err
 /** y = a x: one sum per row, added up from the first column to the last. An empty a or x gives an
     empty y. alignedCopy changes nothing.
     Codes: ErrNegativeDimension (a size is below 0), ErrInnerDimensionMismatch (a has not as many
-    columns as x has elements), ErrOutOfMemory (the host refused the resize). */
+    columns as x has elements), ErrOutOfMemory (the host refused the resize).
+    NaN: a in some results; x in all results. */
 QX_API int32_t AxVectAligned_head(QX_IN DBL2D a, QX_IN DBL1D x, QX_OUT DBL1D y, int32_t alignedCopy,
                                   QX_OUT ErrorCode *err);
 /** As AxVectAligned_head, with alignedCopy 0. */
@@ -47,7 +49,8 @@ QX_API int32_t AxVectorCx(QX_IN CDB2D a, QX_IN CDB1D x, QX_OUT CDB1D y, QX_OUT E
 /** y = x a with x as a matrix of one row, by the product of matrices.
     Codes: ErrInnerDimensionMismatch (x has not as many elements as a has rows),
     ErrNegativeDimension (a size is below 0), ErrOutOfMemory (no memory, or the host refused the
-    resize). */
+    resize).
+    NaN: x in all results; a in some results. */
 QX_API int32_t vectxAAligned_head(QX_IN DBL1D x, QX_IN DBL2D a, QX_OUT DBL1D y, int32_t alignedCopy,
                                   QX_OUT ErrorCode *err);
 /** As vectxAAligned_head, with alignedCopy 0. */

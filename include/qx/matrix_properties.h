@@ -18,7 +18,8 @@ QX_BEGIN_DECLS
     Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrInvalidSelector
     (*matrixType is not 0 to 3), ErrNonFiniteInput (a holds NaN or infinity), ErrOutOfMemory (no
     memory), ErrNotPositiveDefinite (*matrixType is 1, the order is not 2, and a is not positive
-    definite, or nearly not). */
+    definite, or nearly not).
+    NaN: a refused with ErrNonFiniteInput. */
 QX_API int32_t Determinant_head(QX_IN DBL2D a, QX_IN const int32_t *matrixType, QX_OUT DBL *det,
                                 QX_OUT ErrorCode *err);
 /** As Determinant_head, for complex data. */
@@ -31,7 +32,8 @@ QX_API int32_t CxDeterminant_head(QX_IN CDB2D a, QX_IN const int32_t *matrixType
     rank 4 it counts wrong in 41 at a norm of 0.01, 208 at 1e-6 and 463 at 1e-12 (measured); scale a
     up, or give a tolerance. A largest value that overflows gives rank 0 then. A failure leaves -1.
     Codes: ErrEmptyInput (a is empty), ErrNonFiniteInput (a holds NaN or infinity), ErrOutOfMemory
-    (no memory), ErrIterationLimit (the singular values do not converge). */
+    (no memory), ErrIterationLimit (the singular values do not converge).
+    NaN: a refused with ErrNonFiniteInput; tolerance in no result. */
 QX_API int32_t Rank_head(QX_IN DBL2D a, QX_IN const double *tolerance, QX_OUT int32_t *rank,
                          QX_OUT ErrorCode *err);
 /** As Rank_head, for complex data. */
@@ -45,7 +47,8 @@ QX_API int32_t CxRank_head(QX_IN CDB2D a, QX_IN const double *tolerance, QX_OUT 
     off by 6e-9 at a norm of 1e-8, 5e-4 at 1e-10 and 8e-2 at 1e-12 (measured).
     Codes: ErrEmptyInput (a is empty), ErrNonFiniteInput (a holds NaN or infinity),
     ErrInvalidSelector (*normType is not 0 to 3), ErrNotSquare (a is not square, of types 1 to 3),
-    ErrOutOfMemory (no memory), ErrIterationLimit (the singular values do not converge). */
+    ErrOutOfMemory (no memory), ErrIterationLimit (the singular values do not converge).
+    NaN: a refused with ErrNonFiniteInput. */
 QX_API int32_t CondNumber_head(QX_IN DBL2D a, QX_IN const int32_t *normType, QX_OUT DBL *cond,
                                QX_OUT ErrorCode *err);
 /** As CondNumber_head, for complex data. */
@@ -59,7 +62,8 @@ QX_API int32_t CxCondNumber_head(QX_IN CDB2D a, QX_IN const int32_t *normType, Q
     1e-10, 3e-7 at 1e-12 and 5e-3 at 1e-14 (measured).
     Codes: ErrEmptyInput (a is empty), ErrNonFiniteInput (a holds NaN or infinity),
     ErrInvalidSelector (*normType is not 0 to 3), ErrOutOfMemory (no memory), ErrIterationLimit (the
-    singular values do not converge). */
+    singular values do not converge).
+    NaN: a refused with ErrNonFiniteInput. */
 QX_API int32_t Norm_head(QX_IN DBL2D a, QX_IN const int32_t *normType, QX_OUT DBL *norm,
                          QX_OUT ErrorCode *err);
 /** As Norm_head, for complex data. */
@@ -67,13 +71,15 @@ QX_API int32_t CxNorm_head(QX_IN CDB2D a, QX_IN const int32_t *normType, QX_OUT 
                            QX_OUT ErrorCode *err);
 
 /** Sum of the diagonal of a square matrix.
-    Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty). */
+    Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty).
+    NaN: a in all results or in no result. */
 QX_API int32_t Trace_head(QX_IN DBL2D a, QX_OUT DBL *trace, QX_OUT ErrorCode *err);
 /** As Trace_head, for complex data. */
 QX_API int32_t CxTrace_head(QX_IN CDB2D a, QX_OUT CDB *trace, QX_OUT ErrorCode *err);
 
 /** Sum of x[i] y[i], in ascending order.
-    Codes: ErrSizeMismatch (the lengths differ), ErrEmptyInput (x and y are empty). */
+    Codes: ErrSizeMismatch (the lengths differ), ErrEmptyInput (x and y are empty).
+    NaN: x, y in all results. */
 QX_API int32_t DotProduct_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_OUT DBL *dot,
                                QX_OUT ErrorCode *err);
 /** As DotProduct_head, for complex data; nothing is conjugated. */
@@ -82,19 +88,22 @@ QX_API int32_t DotprodCx(QX_IN CDB1D x, QX_IN CDB1D y, QX_OUT CDB *dot, QX_OUT E
 /** p-norm (sum of |x[i]|^p)^(1/p), also for negative p; the largest |x[i]| for p = +infinity, the
     smallest for p = -infinity. NaN if x holds NaN, whatever p. Sums and powers that overflow give
     infinity, squares from elements of about 1e154 on; squares of elements below 1e-162 vanish.
-    Codes: ErrEmptyInput (x is empty), ErrNonFiniteInput (p is NaN), ErrTooFewWeights (p is 0). */
+    Codes: ErrEmptyInput (x is empty), ErrNonFiniteInput (p is NaN), ErrTooFewWeights (p is 0).
+    NaN: x in all results; p refused with ErrNonFiniteInput. */
 QX_API ErrorCode vectorNormH(QX_IN DBL1D x, double p, QX_OUT DBL *norm);
 /** As vectorNormH, for complex data. */
 QX_API ErrorCode CxVectorNormH(QX_IN CDB1D x, double p, QX_OUT DBL *norm);
 
 /** Scales x to the 2-norm 1 and gives its former norm. A norm of 0 or infinity leaves x as it is.
-    Codes: ErrEmptyInput (x is empty). */
+    Codes: ErrEmptyInput (x is empty).
+    NaN: x in some results. */
 QX_API int32_t unitVector_head(QX_INOUT DBL1D x, QX_OUT DBL *norm, QX_OUT ErrorCode *err);
 /** As unitVector_head, for complex data. */
 QX_API int32_t CxUnitVector_head(QX_INOUT CDB1D x, QX_OUT DBL *norm, QX_OUT ErrorCode *err);
 
 /** As unitVector_head, for the p-norm of vectorNormH.
-    Codes: ErrEmptyInput (x is empty), ErrNonFiniteInput (p is NaN), ErrTooFewWeights (p is 0). */
+    Codes: ErrEmptyInput (x is empty), ErrNonFiniteInput (p is NaN), ErrTooFewWeights (p is 0).
+    NaN: x in some results; p refused with ErrNonFiniteInput. */
 QX_API int32_t unitVector80_head(QX_INOUT DBL1D x, double p, QX_OUT DBL *norm,
                                  QX_OUT ErrorCode *err);
 /** As unitVector80_head, for complex data. */
@@ -105,7 +114,8 @@ QX_API int32_t CxUnitVector80_head(QX_INOUT CDB1D x, double p, QX_OUT DBL *norm,
     with `relative` not 0 the order of a times the tolerance times the largest |a[i][j]|, with
     2.2e-16 for a negative tolerance.
     Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrNonFiniteInput (a holds
-    NaN or infinity). */
+    NaN or infinity).
+    NaN: a refused with ErrNonFiniteInput; tolerance in no result. */
 QX_API ErrorCode CheckSym_head(QX_IN DBL2D a, double tolerance, int32_t relative,
                                QX_OUT int32_t *isSymmetric);
 
@@ -118,10 +128,12 @@ QX_API ErrorCode CxCheckSym_head(QX_IN CDB2D a, double tolerance, int32_t relati
     largest modulus of them.
     Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrNonFiniteInput (a is
     symmetric and holds infinity), ErrOutOfMemory (no memory), ErrIterationLimit (the eigenvalues do
-    not converge). */
+    not converge).
+    NaN: a refused with ErrNonFiniteInput or in no result. */
 QX_API int32_t CheckPosdef_head(QX_IN DBL2D a, QX_OUT int32_t *isPositiveDefinite,
                                 QX_OUT ErrorCode *err);
-/** As CheckPosdef_head, for complex data: exactly Hermitian. */
+/** As CheckPosdef_head, for complex data: exactly Hermitian.
+    NaN: a in no result. */
 QX_API int32_t CxCheckPosdef_head(QX_IN CDB2D a, QX_OUT int32_t *isPositiveDefinite,
                                   QX_OUT ErrorCode *err);
 
@@ -131,7 +143,8 @@ QX_API int32_t CxCheckPosdef_head(QX_IN CDB2D a, QX_OUT int32_t *isPositiveDefin
     left may be below -t, and once none is above t all that is left must vanish within t. rank is
     -1 where the answer is 0, and after a failure.
     Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrNonFiniteInput (a holds
-    NaN or infinity), ErrOutOfMemory (no memory). */
+    NaN or infinity), ErrOutOfMemory (no memory).
+    NaN: a refused with ErrNonFiniteInput; tolerance in no result. */
 QX_API ErrorCode CheckPosSemiDef_head(QX_IN DBL2D a, double tolerance,
                                       QX_OUT int32_t *isSemiDefinite, QX_OUT int32_t *rank);
 /** As CheckPosSemiDef_head, for complex data: Hermitian within t. */
@@ -142,7 +155,8 @@ QX_API ErrorCode CxCheckPosSemiDef_head(QX_IN CDB2D a, double tolerance,
     is 1. They are multiplied up from the eigenvalues.
     Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory, or
     the host refused the resize), ErrNonFiniteInput (a holds NaN or infinity), ErrIterationLimit
-    (the eigenvalues do not converge), ErrOverflow (a coefficient overflows). */
+    (the eigenvalues do not converge), ErrOverflow (a coefficient overflows).
+    NaN: a refused with ErrNonFiniteInput. */
 QX_API int32_t MatrixCharacteristicPoly_head(QX_IN DBL2D a, QX_OUT DBL1D poly,
                                              QX_OUT ErrorCode *err);
 /** As MatrixCharacteristicPoly_head, for complex data. */

@@ -29,7 +29,8 @@ QX_BEGIN_DECLS
     ErrNonFiniteInput (a weight is NaN), ErrTooFewWeights (all weights but one are 0),
     ErrPolynomialOrderTooHigh (less than two values have the sign of most), ErrNonFiniteInput (a
     sample is not finite), ErrOutOfMemory (no memory), ErrIterationLimit (singular values do not
-    converge). */
+    converge).
+    NaN: y in some results; x, deviations refused with ErrNonFiniteInput. */
 QX_API ErrorCode ExpFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D deviations,
                              QX_OUT double *a, QX_OUT double *b, QX_OUT double *mse);
 /** y = a exp(b x), with weights as they are. Method 0 is that of ExpFit_head, which leaves
@@ -41,7 +42,8 @@ QX_API ErrorCode ExpFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D deviat
     ErrPolynomialOrderTooHigh (less than two values have the sign of most), ErrNonFiniteInput (a
     sample or a step's exponential is not finite), ErrOutOfMemory (no memory), ErrIterationLimit
     (singular values do not converge), WarnFitIncomplete (the guess has neither no values nor
-    two). */
+    two).
+    NaN: y in some results; x, w refused with ErrNonFiniteInput; tolerance, floor in no result. */
 QX_API ErrorCode ExpFit80_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, double tolerance,
                                QX_IN DBL1D guess, uint16_t method, QX_OUT double *a,
                                QX_OUT double *b, QX_OUT double *mse, QX_INOUT int32_t *iterations,
@@ -50,9 +52,12 @@ QX_API ErrorCode ExpFit80_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, d
     Codes: ErrSizeMismatch (the arrays differ in length), ErrFewerThanTwo (less than two samples),
     ErrPolynomialOrderTooHigh (less than two values have the sign of most), ErrNonFiniteInput (a
     sample is not finite), ErrOutOfMemory (no memory), ErrIterationLimit (singular values do not
-    converge). */
+    converge).
+    NaN: y in no result; x refused with ErrNonFiniteInput. */
 QX_API ErrorCode ExpFitCoef_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_OUT double *a, QX_OUT double *b);
-/** As ExpFit80_head, for the coefficients alone. */
+/** As ExpFit80_head, for the coefficients alone.
+    NaN: y, x, tolerance, floor in no result; w refused with ErrNonFiniteInput; guess in some
+    results. */
 QX_API ErrorCode ExpFitCoef80_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, int32_t method,
                                    double tolerance, QX_IN DBL1D guess, QX_OUT double *a,
                                    QX_OUT double *b, QX_INOUT int32_t *iterations, double floor);
@@ -67,11 +72,15 @@ QX_API ErrorCode ExpFitCoef80_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, 
     ErrNotStrictlyPositive (an x is not above 0), ErrPolynomialOrderTooHigh (less than two values
     have the sign of most), ErrNonFiniteInput (a sample or a step's power is not finite),
     ErrOutOfMemory (no memory), ErrIterationLimit (singular values do not converge),
-    WarnFitIncomplete (the guess has neither no values nor two). */
+    WarnFitIncomplete (the guess has neither no values nor two).
+    NaN: y in some results; x refused with ErrNotStrictlyPositive; w refused with ErrNonFiniteInput;
+    tolerance, floor in no result. */
 QX_API ErrorCode PowerFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, double tolerance,
                                QX_IN DBL1D guess, QX_OUT double *a, QX_OUT double *b,
                                QX_OUT double *mse, QX_INOUT int32_t *iterations, double floor);
-/** As PowerFit_head, for the coefficients alone. */
+/** As PowerFit_head, for the coefficients alone.
+    NaN: y, tolerance, floor in no result; x refused with ErrNotStrictlyPositive; w refused with
+    ErrNonFiniteInput; guess in some results. */
 QX_API ErrorCode PowerFitCoef_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, double tolerance,
                                    QX_IN DBL1D guess, QX_OUT double *a, QX_OUT double *b,
                                    QX_INOUT int32_t *iterations, double floor);
@@ -85,7 +94,8 @@ QX_API ErrorCode PowerFitCoef_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, 
     Codes: ErrSizeMismatch (the arrays differ in length), ErrNotStrictlyPositive (the base is 0 or
     below), ErrFewerThanTwo (less than two samples), ErrNonFiniteInput (a weight is NaN),
     ErrTooFewWeights (all weights but one are 0), ErrMixedSigns (the x are neither all above nor all
-    below 0), ErrOutOfMemory (no memory). */
+    below 0), ErrOutOfMemory (no memory).
+    NaN: y, base in all results; x refused with ErrMixedSigns; w refused with ErrNonFiniteInput. */
 QX_API ErrorCode LogFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, double base,
                              QX_OUT double *a, QX_OUT double *b, QX_OUT double *mse);
 /** As LogFit_head, for the coefficients alone. */
@@ -103,12 +113,15 @@ QX_API ErrorCode LogFitCoef_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, do
     samples), ErrNonFiniteInput (a weight is NaN), ErrTooFewWeights (less than three weights are not
     0), ErrNonFiniteInput (an x is not finite), ErrFitStartValues (the deviation to start from is 0,
     or a lone peak has no neighbour of its sign on a side), ErrOutOfMemory (no memory),
-    WarnFitIncomplete (the guess has neither no values nor three). */
+    WarnFitIncomplete (the guess has neither no values nor three).
+    NaN: y refused with ErrFitStartValues or in some results; x, w refused with ErrNonFiniteInput;
+    tolerance, floor in no result. */
 QX_API ErrorCode GaussianPeakFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w,
                                       double tolerance, QX_IN DBL1D guess, QX_OUT double *a,
                                       QX_OUT double *c, QX_OUT double *s, QX_OUT double *mse,
                                       QX_INOUT int32_t *iterations, double floor);
-/** As GaussianPeakFit_head, for the coefficients alone. */
+/** As GaussianPeakFit_head, for the coefficients alone.
+    NaN: y, tolerance, guess, floor in no result; x, w refused with ErrNonFiniteInput. */
 QX_API ErrorCode GaussianPeakFitCoef_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w,
                                           double tolerance, QX_IN DBL1D guess, QX_OUT double *a,
                                           QX_OUT double *c, QX_OUT double *s,

@@ -53,7 +53,8 @@ typedef struct BinomialCache {
 
 /** Uniform white noise: x[i] = (u - 0.5) (2 amplitude), *n samples in [-amplitude, amplitude). The
     function result is 0, or the host's status where it refused the resize.
-    Codes: ErrEmptyInput (*n is below 1), ErrOutOfMemory (the host refused the resize). */
+    Codes: ErrEmptyInput (*n is below 1), ErrOutOfMemory (the host refused the resize).
+    NaN: amplitude in all results. */
 QX_API int32_t white(QX_OUT DBL1D x, QX_IN const int32_t *n, QX_IN const double *amplitude,
                      QX_IN const int32_t *seed, QX_OUT ErrorCode *err, QX_INOUT RandomState *state);
 
@@ -62,7 +63,8 @@ QX_API int32_t white(QX_OUT DBL1D x, QX_IN const int32_t *n, QX_IN const double 
     pairs and the second of a pair is kept in `spare`, unscaled, for the next sample or the next
     call; a seed above 0 forgets it. The function result is 0, or the host's status where it refused
     the resize.
-    Codes: ErrEmptyInput (*n is below 1), ErrOutOfMemory (the host refused the resize). */
+    Codes: ErrEmptyInput (*n is below 1), ErrOutOfMemory (the host refused the resize).
+    NaN: sigma in all results; spare.spare in some results or in no result. */
 QX_API int32_t Gauss(QX_OUT DBL1D x, QX_IN const int32_t *n, QX_IN const double *sigma,
                      QX_IN const int32_t *seed, QX_OUT ErrorCode *err, QX_INOUT RandomState *state,
                      QX_INOUT GaussSpare *spare);
@@ -72,7 +74,8 @@ QX_API int32_t Gauss(QX_OUT DBL1D x, QX_IN const int32_t *n, QX_IN const double 
     integers from 0 to 32767, taken as radians. Where *n *amplitude overflows all samples are NaN.
     The code stands in *err and is the function result, which is the host's status instead where it
     refused the resize.
-    Codes: ErrEmptyInput (*n is below 1), ErrOutOfMemory (no memory). */
+    Codes: ErrEmptyInput (*n is below 1), ErrOutOfMemory (no memory).
+    NaN: amplitude in all results. */
 QX_API int32_t PeriodNoise(QX_IN const int32_t *n, QX_IN const double *amplitude,
                            QX_IN const int32_t *seed, QX_OUT DBL1D x, QX_OUT ErrorCode *err,
                            QX_INOUT RandomState *state);
@@ -92,7 +95,8 @@ QX_API ErrorCode GammaNoiseH(QX_OUT DBL1D x, int32_t n, int32_t order, int32_t s
     deviation comes out 2.5 % too large at a mean of 1e14, 10 % at 1e15, 2.9 times at 1e16, and
     beyond that the numbers are no Poisson noise, near 1e308 infinite.
     Codes: ErrInvalidSelector (the mean is negative), ErrEmptyInput (n is below 1), ErrOutOfMemory
-    (the host refused the resize). */
+    (the host refused the resize).
+    NaN: mean in all results. */
 QX_API ErrorCode PoissonNoiseH(QX_OUT DBL1D x, int32_t n, double mean, int32_t seed,
                                QX_INOUT RandomState *state);
 
@@ -100,7 +104,9 @@ QX_API ErrorCode PoissonNoiseH(QX_OUT DBL1D x, int32_t n, double mean, int32_t s
     are carried out; where min(p, 1 - p) trials is below 1 the successes are counted as Poisson
     events; otherwise by rejection from a Lorentzian.
     Codes: ErrInvalidSelector (trials is negative, or p does not lie in 0 to 1), ErrEmptyInput (n is
-    below 1), ErrOutOfMemory (the host refused the resize). */
+    below 1), ErrOutOfMemory (the host refused the resize).
+    NaN: p refused with ErrInvalidSelector; cache.enOld, cache.lnGammaEn1, cache.logP, cache.logPc,
+    cache.pOld, cache.pc in no result. */
 QX_API ErrorCode BinomialNoiseH(QX_OUT U32_1D x, int32_t n, int32_t trials, double p, int32_t seed,
                                 QX_INOUT RandomState *state, QX_INOUT BinomialCache *cache);
 

@@ -12,7 +12,8 @@ QX_BEGIN_DECLS
 
 /** Median: the middle value, or the mean of the two middle values.
     Codes: ErrEmptyInput (x is empty), ErrNaNInData (x contains NaN), ErrOutOfMemory (no scratch
-    memory). */
+    memory).
+    NaN: x refused with ErrNaNInData. */
 QX_API int32_t Median_head(QX_IN DBL1D x, QX_OUT DBL *median, QX_OUT ErrorCode *err);
 
 /** The most frequent values of x in ascending order. With `intervals` above 0 the centres of the
@@ -21,7 +22,8 @@ QX_API int32_t Median_head(QX_IN DBL1D x, QX_OUT DBL *median, QX_OUT ErrorCode *
     relative distance of 2.22e-16. Empty for a single sample and where nothing occurs twice. The
     code is the function result.
     Codes: ErrEmptyInput (x is empty), ErrOutOfMemory (no scratch memory, more than 268435455
-    intervals, or the host refused the resize). */
+    intervals, or the host refused the resize).
+    NaN: x in no result. */
 QX_API ErrorCode ModeH(QX_IN DBL1D x, int32_t intervals, QX_OUT DBL1D modes);
 
 QX_END_DECLS

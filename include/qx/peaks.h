@@ -52,7 +52,8 @@ typedef struct PeakDState {
     first sample of each, *count their number. NaN ends a run. The function result is the code, or
     the host's status where it refused a resize.
     Codes: ErrWidthOutOfRange (*width is below 1 or not below the size of x, as in an empty array),
-    ErrOutOfMemory (the host refused a resize). */
+    ErrOutOfMemory (the host refused a resize).
+    NaN: x, threshold in no result. */
 QX_API int32_t PeakDetector(QX_IN DBL1D x, QX_IN const double *threshold,
                             QX_IN const int32_t *width, QX_OUT I32_1D indices,
                             QX_OUT int32_t *count, QX_OUT ErrorCode *err);
@@ -60,7 +61,8 @@ QX_API int32_t PeakDetector(QX_IN DBL1D x, QX_IN const double *threshold,
 /** As PeakD2014, with mode 0. */
 QX_API ErrorCode PeakD(QX_INOUT PeakDRequest *request, QX_INOUT PeakDState *state,
                        QX_INOUT DBL1D *buffer, QX_OUT ErrorCode *err);
-/** As PeakD2014, without a source: mode 2 has no data. */
+/** As PeakD2014, without a source: mode 2 has no data.
+    NaN: request.data in some results; request.threshold in no result. */
 QX_API ErrorCode PeakD2010(QX_INOUT PeakDRequest *request, QX_INOUT PeakDState *state,
                            QX_INOUT DBL1D *buffer, QX_OUT ErrorCode *err, int32_t mode);
 
@@ -87,7 +89,8 @@ QX_API ErrorCode PeakD2010(QX_INOUT PeakDRequest *request, QX_INOUT PeakDState *
     or above 1073741824, or no such mode or polarity), ErrStateSizeMismatch (not the first block and
     the state is of another width), ErrWidthOutOfRange (a block of less than w samples),
     ErrNoUsableFit (buffer is null), ErrOverflow (2^31 windows in one stream), ErrIterationLimit
-    (the operator of the window cannot be computed). */
+    (the operator of the window cannot be computed).
+    NaN: source, request.threshold in no result; request.data in some results or in no result. */
 QX_API ErrorCode PeakD2014(QX_IN DBL1D source, QX_INOUT PeakDRequest *request,
                            QX_INOUT PeakDState *state, QX_INOUT DBL1D *buffer,
                            QX_OUT ErrorCode *err, int32_t mode);

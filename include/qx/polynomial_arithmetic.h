@@ -12,14 +12,16 @@ QX_BEGIN_DECLS
 
 /** The sum r = p + q, as long as the longer of the two. Zeros at the top stay.
     Codes: ErrNonFiniteInput (a coefficient), ErrOverflow (a sum is not finite), ErrOutOfMemory
-    (the host refuses r). */
+    (the host refuses r).
+    NaN: p, q refused with ErrNonFiniteInput. */
 QX_API ErrorCode AddPolyH(QX_IN DBL1D p, QX_IN DBL1D q, QX_OUT DBL1D r);
 /** As AddPolyH, for complex coefficients. */
 QX_API ErrorCode CxAddPolyH(QX_IN CDB1D p, QX_IN CDB1D q, QX_OUT CDB1D r);
 
 /** The difference r = p - q, as long as the longer of the two. Zeros at the top stay.
     Codes: ErrNonFiniteInput (a coefficient), ErrOverflow (a difference is not finite),
-    ErrOutOfMemory (the host refuses r). */
+    ErrOutOfMemory (the host refuses r).
+    NaN: p, q refused with ErrNonFiniteInput. */
 QX_API ErrorCode SubtractPolyH(QX_IN DBL1D p, QX_IN DBL1D q, QX_OUT DBL1D r);
 /** As SubtractPolyH, for complex coefficients. */
 QX_API ErrorCode CxSubtractPolyH(QX_IN CDB1D p, QX_IN CDB1D q, QX_OUT CDB1D r);
@@ -29,7 +31,8 @@ QX_API ErrorCode CxSubtractPolyH(QX_IN CDB1D p, QX_IN CDB1D q, QX_OUT CDB1D r);
     The time grows with m n; for thousands of coefficients of similar size Convolution by
     transforms is faster, though its errors are relative to the largest coefficient.
     Codes: ErrNonFiniteInput (a coefficient), ErrLengthTooLarge (m + n - 1 above 2^31 - 1),
-    ErrOverflow (a coefficient of r is not finite), ErrOutOfMemory (the host refuses r). */
+    ErrOverflow (a coefficient of r is not finite), ErrOutOfMemory (the host refuses r).
+    NaN: p, q refused with ErrNonFiniteInput. */
 QX_API ErrorCode MultiplyPolyH(QX_IN DBL1D p, QX_IN DBL1D q, QX_OUT DBL1D r);
 /** As MultiplyPolyH, for complex coefficients. */
 QX_API ErrorCode CxMultiplyPolyH(QX_IN CDB1D p, QX_IN CDB1D q, QX_OUT CDB1D r);
@@ -41,7 +44,8 @@ QX_API ErrorCode CxMultiplyPolyH(QX_IN CDB1D p, QX_IN CDB1D q, QX_OUT CDB1D r);
     divides exactly as long as all intermediate numbers are below 2^53.
     Codes: ErrEmptyInput (q is empty), ErrNonFiniteInput (a coefficient), ErrAllCoefficientsZero
     (q is 0), ErrOverflow (a coefficient of a result is not finite), ErrOutOfMemory (no memory,
-    or the host refuses an output). */
+    or the host refuses an output).
+    NaN: p, q refused with ErrNonFiniteInput. */
 QX_API ErrorCode DividePolyH(QX_IN DBL1D p, QX_IN DBL1D q, QX_OUT DBL1D quotient,
                              QX_OUT DBL1D remainder);
 /** As DividePolyH, for complex coefficients. */
@@ -61,7 +65,8 @@ QX_API ErrorCode CxDividePolyH(QX_IN CDB1D p, QX_IN CDB1D q, QX_OUT CDB1D quotie
     time with the cube of the sum of the degrees, which cannot exceed about 11500.
     Codes: ErrEmptyInput (p or q is empty), ErrNonFiniteInput (a coefficient; an infinite
     tolerance), ErrAllCoefficientsZero (p and q are 0), ErrOverflow (a coefficient of the monic
-    divisor is not finite), ErrOutOfMemory (no memory, or the host refuses gcd). */
+    divisor is not finite), ErrOutOfMemory (no memory, or the host refuses gcd).
+    NaN: p, q refused with ErrNonFiniteInput; tolerance in no result. */
 QX_API ErrorCode PolyGCD_H(QX_IN DBL1D p, QX_IN DBL1D q, double tolerance, QX_OUT DBL1D gcd,
                            QX_OUT double *distance);
 /** As PolyGCD_H, for complex coefficients. */
@@ -73,7 +78,8 @@ QX_API ErrorCode CxPolyGCD_H(QX_IN CDB1D p, QX_IN CDB1D q, double tolerance, QX_
     CxMultiplyPolyH give it.
     Codes: ErrEmptyInput (p or q is empty), ErrNonFiniteInput (a coefficient; an infinite
     tolerance), ErrAllCoefficientsZero (p or q is 0), ErrOverflow (a coefficient of lcm is not
-    finite), ErrOutOfMemory (no memory, or the host refuses lcm). */
+    finite), ErrOutOfMemory (no memory, or the host refuses lcm).
+    NaN: p, q refused with ErrNonFiniteInput; tolerance in no result. */
 QX_API ErrorCode PolyLCM_H(QX_IN DBL1D p, QX_IN DBL1D q, double tolerance, QX_OUT DBL1D lcm);
 
 /** Values y[i] = p(x[i]) by Horner's rule with compensation, as accurate as if computed in twice
@@ -85,7 +91,8 @@ QX_API ErrorCode PolyLCM_H(QX_IN DBL1D p, QX_IN DBL1D q, double tolerance, QX_OU
     NaN gives NaN, and so may an infinity (0 times infinity); a constant has its value
     everywhere. Values overflow to infinities.
     Codes: ErrEmptyInput (p is empty), ErrNonFiniteInput (a coefficient), ErrOutOfMemory (the
-    host refuses y). */
+    host refuses y).
+    NaN: p refused with ErrNonFiniteInput; x in some results. */
 QX_API ErrorCode PolyEv(QX_IN DBL1D p, QX_IN DBL1D x, QX_OUT DBL1D y);
 /** As PolyEv, for complex coefficients and points (S. Graillat and V. Menissier-Morain,
     "Accurate summation, dot product and polynomial evaluation in complex floating point
@@ -99,7 +106,8 @@ QX_API ErrorCode CxPolyEv(QX_IN CDB1D p, QX_IN CDB1D x, QX_OUT CDB1D y);
     matrix gives an empty one.
     Codes: ErrEmptyInput (p is empty), ErrInvalidSelector (mode), ErrNotSquare (mode 1),
     ErrNonFiniteInput (a coefficient or an element), ErrOverflow (mode 1: an element of y is not
-    finite; values of mode 0 become infinite), ErrOutOfMemory (no memory, or the host refuses y). */
+    finite; values of mode 0 become infinite), ErrOutOfMemory (no memory, or the host refuses y).
+    NaN: p, a refused with ErrNonFiniteInput. */
 QX_API ErrorCode EvPoly2D(QX_IN DBL1D p, QX_IN DBL2D a, int32_t mode, QX_OUT DBL2D y);
 /** As EvPoly2D, for complex coefficients and elements, with values as of CxPolyEv. */
 QX_API ErrorCode CxEvPoly2D(QX_IN CDB1D p, QX_IN CDB2D a, int32_t mode, QX_OUT CDB2D y);
@@ -108,16 +116,19 @@ QX_API ErrorCode CxEvPoly2D(QX_IN CDB1D p, QX_IN CDB2D a, int32_t mode, QX_OUT C
     each within an ulp. Order 0 copies; an order of p's length or above gives one 0.
     Codes: ErrEmptyInput (p is empty), ErrNegativeCount (order), ErrNonFiniteInput (a
     coefficient), ErrOverflow (a coefficient of q is not finite), ErrOutOfMemory (the host
-    refuses q). */
+    refuses q).
+    NaN: p refused with ErrNonFiniteInput. */
 QX_API ErrorCode PolyDerivativeH(QX_IN DBL1D p, int32_t order, QX_OUT DBL1D q);
 /** As PolyDerivativeH, for complex coefficients. */
 QX_API ErrorCode CxPolyDerivativeH(QX_IN CDB1D p, int32_t order, QX_OUT CDB1D q);
 
 /** The integral q with q[0] = constant and q[k + 1] = p[k] / (k + 1).
     Codes: ErrEmptyInput (p is empty), ErrNonFiniteInput (a coefficient or the constant),
-    ErrLengthTooLarge (p has 2^31 - 1 coefficients), ErrOutOfMemory (the host refuses q). */
+    ErrLengthTooLarge (p has 2^31 - 1 coefficients), ErrOutOfMemory (the host refuses q).
+    NaN: p, constant refused with ErrNonFiniteInput. */
 QX_API ErrorCode PolyIntegralH(QX_IN DBL1D p, double constant, QX_OUT DBL1D q);
-/** As PolyIntegralH, for complex coefficients and constant. */
+/** As PolyIntegralH, for complex coefficients and constant.
+    NaN: p, constant.im, constant.re refused with ErrNonFiniteInput. */
 QX_API ErrorCode CxPolyIntegralH(QX_IN CDB1D p, QX_IN const CDB *constant, QX_OUT CDB1D q);
 
 /** The composition r(x) = p(q(x)) of (m - 1) (n - 1) + 1 coefficients by Horner's rule; zeros at
@@ -125,7 +136,8 @@ QX_API ErrorCode CxPolyIntegralH(QX_IN CDB1D p, QX_IN const CDB *constant, QX_OU
     n^2.
     Codes: ErrNonFiniteInput (a coefficient), ErrLengthTooLarge (a result above 2^31 - 1),
     ErrOverflow (a coefficient of r is not finite), ErrOutOfMemory (no memory, or the host
-    refuses r). */
+    refuses r).
+    NaN: p, q refused with ErrNonFiniteInput. */
 QX_API ErrorCode PolyComposeH(QX_IN DBL1D p, QX_IN DBL1D q, QX_OUT DBL1D r);
 /** As PolyComposeH, for complex coefficients. */
 QX_API ErrorCode CxPolyComposeH(QX_IN CDB1D p, QX_IN CDB1D q, QX_OUT CDB1D r);
@@ -138,12 +150,14 @@ QX_API ErrorCode CxPolyComposeH(QX_IN CDB1D p, QX_IN CDB1D q, QX_OUT CDB1D r);
     the number of roots.
     Codes: ErrNonFiniteInput (a root), ErrBadCoefficients (a root lacks its conjugate),
     ErrLengthTooLarge (2^31 - 1 roots), ErrOverflow (a coefficient is not finite), ErrOutOfMemory
-    (no memory, or the host refuses p). */
+    (no memory, or the host refuses p).
+    NaN: roots refused with ErrNonFiniteInput. */
 QX_API ErrorCode PolyFromRootsH(QX_IN CDB1D roots, QX_OUT DBL1D p);
 /** The monic complex polynomial with these roots, each as often as it is there; no roots give
     [1]. Factors are multiplied as in PolyFromRootsH.
     Codes: ErrNonFiniteInput (a root), ErrLengthTooLarge (2^31 - 1 roots), ErrOverflow (a
-    coefficient is not finite), ErrOutOfMemory (no memory, or the host refuses p). */
+    coefficient is not finite), ErrOutOfMemory (no memory, or the host refuses p).
+    NaN: roots refused with ErrNonFiniteInput. */
 QX_API ErrorCode CxPolyFromRootsH(QX_IN CDB1D roots, QX_OUT CDB1D p);
 
 /** The partial fractions of a rational function,
@@ -163,7 +177,8 @@ QX_API ErrorCode CxPolyFromRootsH(QX_IN CDB1D roots, QX_OUT CDB1D p);
     Codes: ErrEmptyInput (numerator or denominator is empty), ErrNonFiniteInput (a coefficient;
     an infinite tolerance), ErrAllCoefficientsZero (the denominator is 0), ErrOverflow (a result,
     or the monic denominator, is not finite), ErrIterationLimit (eigenvalues do not converge),
-    ErrOutOfMemory (no memory, or the host refuses an output). */
+    ErrOutOfMemory (no memory, or the host refuses an output).
+    NaN: numerator, denominator refused with ErrNonFiniteInput; tolerance in no result. */
 QX_API ErrorCode PartialFractionsH(QX_IN DBL1D numerator, QX_IN DBL1D denominator, double tolerance,
                                    QX_OUT DBL1D polynomial, QX_OUT CDB1D poles,
                                    QX_OUT CDB1D residues);

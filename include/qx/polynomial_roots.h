@@ -16,7 +16,9 @@ QX_BEGIN_DECLS
     Iterations end when a relative change is below the tolerance, or at their limit, with the best
     values so far. A null array of guesses is an empty one. Where coef is empty, `roots` is emptied.
     Codes: WarnEmptyResult (coef is empty), ErrOutOfMemory (no memory, or the host refuses
-    `roots`). */
+    `roots`).
+    NaN: coef, newtonTolerance, bairstowTolerance in no result; realGuesses, complexGuesses in some
+    results. */
 QX_API ErrorCode PolyRootsNtBst_head(QX_IN DBL1D coef, QX_IN DBL1D realGuesses,
                                      int32_t newtonMaxIterations, double newtonTolerance,
                                      QX_IN CDB1D complexGuesses, int32_t bairstowMaxIterations,
@@ -39,7 +41,8 @@ QX_API ErrorCode PolyRootsNtBst_head(QX_IN DBL1D coef, QX_IN DBL1D realGuesses,
     NaN. The code is in *err.
     Codes: ErrEmptyInput (coef is empty), ErrBadCoefficients (a coefficient is NaN, or the
     polynomial is constant), ErrOutOfMemory (no memory, or the host refuses the resize),
-    ErrNonFiniteFunction (a search came to NaN), ErrIterationLimit (a search does not converge). */
+    ErrNonFiniteFunction (a search came to NaN), ErrIterationLimit (a search does not converge).
+    NaN: coef refused with ErrBadCoefficients. */
 QX_API int32_t CxPolyRoots_head(QX_INOUT CDB1D coef, QX_IN const int32_t *maxIterations,
                                 QX_OUT ErrorCode *err);
 
@@ -66,7 +69,8 @@ QX_API int32_t CxPolyRoots_head(QX_INOUT CDB1D coef, QX_IN const int32_t *maxIte
     Codes: ErrEmptyInput (coef is empty), ErrOutOfMemory (no memory, or the host refuses an output),
     ErrBadCoefficients (a coefficient is not finite), ErrAllCoefficientsZero (all coefficients are
     0), ErrOrderNotPositive (the polynomial is constant), ErrNonFiniteInput (it overflows when it is
-    made monic), ErrIterationLimit (eigenvalues do not converge). */
+    made monic), ErrIterationLimit (eigenvalues do not converge).
+    NaN: coef refused with ErrBadCoefficients; tolerance in no result. */
 QX_API ErrorCode MultPolyRoots_head(QX_INOUT DBL1D coef, int32_t refine, double tolerance,
                                     QX_OUT CDB1D refined, QX_OUT CDB1D simple,
                                     QX_OUT I32_1D multiplicities);

@@ -23,7 +23,8 @@ QX_BEGIN_DECLS
     ErrInvalidSelector (no such mode), ErrNegativeSetting (delayLeft is negative and no reset is in
     force), ErrBadTapCount (a reset is to remove the delay of an even number of taps),
     ErrStateSizeMismatch (state has another size and no reset is in force), ErrOutOfMemory (no
-    memory), WarnEmptyResult (x is empty). */
+    memory), WarnEmptyResult (x is empty).
+    NaN: x in some results; state, h, gain in some results or in no result. */
 QX_API ErrorCode ppMultiRateFIRH_DBL(QX_IN DBL1D x, QX_OUT DBL1D y, QX_INOUT DBL1D state,
                                      int32_t mode, int32_t L, int32_t M, QX_IN DBL1D h, double gain,
                                      QX_IN const uint8_t *reset, QX_IN const uint8_t *removeDelay,

@@ -59,7 +59,8 @@ typedef void *MeasurementInstanceWord;
     ErrMeasureLevelsReversed (dt is not above 0), ErrInvalidSelector (limit is neither 0 nor 1),
     ErrMeasureNotPositive (y is flat, which peaks allow, has no numbers, or spans more than a number
     can), WarnMeasurePartial (by histogram: the bin of a state holds fewer than 5% of the samples;
-    the results stand). */
+    the results stand).
+    NaN: y, t0 in no result; dt refused with ErrMeasureLevelsReversed. */
 QX_API ErrorCode StateLevels(QX_IN DBL1D y, double t0, double dt, int32_t method, int32_t bins,
                              QX_INOUT MeasurementSlot *slot, QX_OUT double *high,
                              QX_OUT double *low, QX_OUT double *amplitude, int32_t limit);
@@ -84,7 +85,9 @@ QX_API ErrorCode StateLevels_IDP(QX_IN DBL1D y, double t0, double dt, int32_t me
    (limit or polarity is neither 0 nor 1), ErrMeasureNotPositive (no amplitude, as in StateLevels),
    ErrMeasureRangeReversed (the references are out of order), ErrMeasureOutOfMemory (no memory for
    the crossings, at most as many as y has samples; or pulseNumber above about 8e7),
-   ErrMeasureSearchShort (too few crossings), WarnMeasurePartial (as in StateLevels). */
+   ErrMeasureSearchShort (too few crossings), WarnMeasurePartial (as in StateLevels).
+    NaN: y, t0, ref.high in no result; dt refused with ErrMeasureLevelsReversed; ref.low, ref.mid
+    refused with ErrMeasureRangeReversed. */
 QX_API ErrorCode PulseMeasEx(QX_IN DBL1D y, double t0, double dt, uint16_t polarity,
                              uint16_t partial, int32_t pulseNumber,
                              QX_IN const ReferenceLevels *ref, QX_IN const HistogramOptions *hist,
@@ -124,7 +127,9 @@ QX_API ErrorCode PulseMeas(QX_IN DBL1D y, double t0, double dt, uint16_t polarit
    and for peaks as well), ErrMeasureRangeReversed (the references are out of order),
    ErrMeasureOutOfMemory (no memory for the transitions, at most as many as y has samples; or number
    above about 3e7), ErrMeasureTooFewPoints (there is no such transition), ErrMeasureOutOfRange (the
-   duration is not above 0), WarnMeasurePartial (as in StateLevels, for peaks as well). */
+   duration is not above 0), WarnMeasurePartial (as in StateLevels, for peaks as well).
+    NaN: y, t0 in no result; dt refused with ErrMeasureLevelsReversed; ref.high, ref.low, ref.mid
+    refused with ErrMeasureRangeReversed. */
 QX_API ErrorCode TransMeas(QX_IN DBL1D y, double t0, double dt, uint16_t polarity, int32_t number,
                            QX_INOUT ReferenceLevels *ref, QX_IN const HistogramOptions *hist,
                            QX_INOUT MeasurementSlot *slot, QX_OUT double *slewRate,
@@ -156,7 +161,9 @@ QX_API ErrorCode TransMeas_IDP(QX_IN DBL1D y, double t0, double dt, uint16_t pol
    ErrMeasureNotPositive (no amplitude, as in StateLevels), ErrMeasureRangeReversed (the references
    are out of order), ErrMeasureOutOfMemory (no memory for so many crossings), ErrMeasureSearchShort
    (too few crossings), ErrMeasureNotFound (a cycle of no samples), WarnMeasurePartial (as in
-   StateLevels). */
+   StateLevels).
+    NaN: y, ref.high in no result; t0 refused with ErrMeasureNotFound; dt refused with
+    ErrMeasureLevelsReversed; ref.low, ref.mid refused with ErrMeasureRangeReversed. */
 QX_API ErrorCode CycleRMSAverage(QX_IN DBL1D y, double t0, double dt, int32_t cycleNumber,
                                  QX_INOUT ReferenceLevels *ref, QX_IN const HistogramOptions *hist,
                                  QX_INOUT MeasurementSlot *slot, QX_OUT double *mean,
@@ -182,7 +189,8 @@ QX_API ErrorCode CycleRMSAverage_IDP(QX_IN DBL1D y, double t0, double dt, int32_
     the waveform does not reach counts as its last sample in delay and width, and as its end,
     counted from the last sample before the missing edge, in riseTime and fallTime. Where top - base
     passes the largest number, amplitude and slewRate are infinite. The function result is 0.
-    Codes: ErrEmptyInput (y is empty). */
+    Codes: ErrEmptyInput (y is empty).
+    NaN: y in no result. */
 QX_API int32_t PulseParameters(QX_IN DBL1D y, QX_OUT double *top, QX_OUT double *base,
                                QX_OUT double *amplitude, QX_OUT double *delay, QX_OUT double *width,
                                QX_OUT double *slewRate, QX_OUT double *fallTime,

@@ -69,7 +69,10 @@ typedef struct QX_PACKED VariableDesign {
     and the state's arrays and clears its numbers.
     Codes: ErrBufferOverrun (the state has no room for the taps or for the samples to be kept, or
     oversample is 0), ErrIndexNotBelowSize (more outputs than y holds), ErrOutOfMemory (no memory,
-    or ratio is 0 or NaN). */
+    or ratio is 0 or NaN).
+    NaN: x in some results; state.fraction, design.start refused with ErrBufferOverrun or in no
+    result; state.history, state.taps, design.proto in some results or in no result; state.ratio,
+    design.ratio refused with ErrOutOfMemory or in no result; state.tapScale in no result. */
 QX_API ErrorCode Resample_Const(QX_IN DBL1D x, QX_INOUT ResampleState *state,
                                 QX_IN const ResampleDesign *design, int32_t reset, QX_OUT DBL1D y,
                                 QX_OUT int32_t *outCount, int32_t antiAlias);
@@ -84,22 +87,30 @@ QX_API ErrorCode CxResample_Const(QX_IN CDB1D x, QX_INOUT CxResampleState *state
     samples (that may be more than x has), appends new ones and calls again. Samples before x[0]
     count as zeros.
     Codes: ErrBufferOverrun (a time is not finite, or oversample is 0), ErrOutOfMemory (no
-    memory). */
+    memory).
+    NaN: x, design.proto, lastTime in no result; t refused with ErrBufferOverrun or in some
+    results. */
 QX_API ErrorCode Resample_Variable(QX_IN DBL1D x, QX_INOUT DBL1D t,
                                    QX_IN const VariableDesign *design, QX_INOUT double *lastTime,
                                    QX_OUT int32_t *outCount, QX_OUT int32_t *consumed);
-/** As Resample_Variable, for complex data; times are the real parts of t. */
+/** As Resample_Variable, for complex data; times are the real parts of t.
+    NaN: x, design.proto in no result; t refused with ErrBufferOverrun or in some results; lastTime
+    refused with ErrBufferOverrun. */
 QX_API ErrorCode CxResample_Variable(QX_IN CDB1D x, QX_INOUT CDB1D t,
                                      QX_IN const VariableDesign *design, QX_INOUT double *lastTime,
                                      QX_OUT int32_t *outCount, QX_OUT int32_t *consumed);
 
 /** As Resample_Variable, for channels in the rows of x; the outputs go to y, a row of *outCount for
-    each channel, and the served times in t stay. */
+    each channel, and the served times in t stay.
+    NaN: x, design.proto in no result; t refused with ErrBufferOverrun or in some results; lastTime
+    refused with ErrBufferOverrun. */
 QX_API ErrorCode Resample_Variable_MultiCh(QX_IN DBL2D x, QX_OUT DBL2D y, QX_INOUT DBL1D t,
                                            QX_IN const VariableDesign *design,
                                            QX_INOUT double *lastTime, QX_OUT int32_t *outCount,
                                            QX_OUT int32_t *consumed);
-/** As Resample_Variable_MultiCh, for complex data. */
+/** As Resample_Variable_MultiCh, for complex data.
+    NaN: x, design.proto, lastTime in no result; t refused with ErrBufferOverrun or in some
+    results. */
 QX_API ErrorCode CxResample_Variable_MultiCh(QX_IN CDB2D x, QX_OUT CDB2D y, QX_INOUT DBL1D t,
                                              QX_IN const VariableDesign *design,
                                              QX_INOUT double *lastTime, QX_OUT int32_t *outCount,

@@ -13,7 +13,8 @@ QX_BEGIN_DECLS
     numbers are NaN. Where 1 / scale is not finite, as for a constant array, scale is given as 1 and
     only the offset is taken away. Where max - min passes the largest number, scale and offset are
     infinite and x becomes NaN.
-    Codes: ErrEmptyInput (x is empty). */
+    Codes: ErrEmptyInput (x is empty).
+    NaN: x in some results. */
 QX_API int32_t Scale(QX_INOUT DBL2D x, QX_OUT double *scale, QX_OUT double *offset,
                      QX_OUT ErrorCode *err);
 /** As Scale, for one dimension, and with the two numbers in the other order. */
@@ -23,7 +24,8 @@ QX_API int32_t Scale1DCIN(QX_INOUT DBL1D x, QX_OUT double *offset, QX_OUT double
 /** Divides x by its largest magnitude, which `scale` gives. NaN takes no part. An array without a
     magnitude above 0 stays as it is, and the scale is 0. By a magnitude up to 5.5e-309, whose
     reciprocal overflows, x becomes infinite, and NaN where it is 0.
-    Codes: ErrEmptyInput (x is empty). */
+    Codes: ErrEmptyInput (x is empty).
+    NaN: x in some results. */
 QX_API int32_t QScale(QX_INOUT DBL2D x, QX_OUT double *scale, QX_OUT ErrorCode *err);
 /** As QScale, for one dimension. */
 QX_API int32_t QS1D(QX_INOUT DBL1D x, QX_OUT double *scale, QX_OUT ErrorCode *err);
@@ -33,7 +35,8 @@ QX_API int32_t QS1D(QX_INOUT DBL1D x, QX_OUT double *scale, QX_OUT ErrorCode *er
     array becomes NaN; where its mean is rounded, 1, -1 or infinite instead. Deviations below 1e-162
     vanish in their squares: x becomes infinite or NaN. From 1e154 on the squares overflow: sd is
     infinite and x becomes 0, or NaN where the sum of x overflows, too.
-    Codes: ErrEmptyInput (x is empty). */
+    Codes: ErrEmptyInput (x is empty).
+    NaN: x in all results. */
 QX_API int32_t Norm1(QX_INOUT DBL1D x, QX_OUT double *mean, QX_OUT double *sd,
                      QX_OUT ErrorCode *err);
 /** As Norm1, over all elements of a matrix. */
@@ -41,7 +44,8 @@ QX_API int32_t Norm2(QX_INOUT DBL2D x, QX_OUT double *mean, QX_OUT double *sd,
                      QX_OUT ErrorCode *err);
 
 /** x becomes a x + b, infinite or NaN where that overflows. The function result is the code.
-    Codes: ErrEmptyInput (x is empty). */
+    Codes: ErrEmptyInput (x is empty).
+    NaN: x in some results; a, b in all results. */
 QX_API ErrorCode Line1(QX_INOUT DBL1D x, QX_IN const double *a, QX_IN const double *b);
 /** As Line1, for a matrix. */
 QX_API ErrorCode LinEv(QX_INOUT DBL2D x, double a, double b);
@@ -50,7 +54,8 @@ QX_API ErrorCode LinEv(QX_INOUT DBL2D x, double a, double b);
     half a turn of the one before it, x[i] - floor((x[i] - x[i-1]) / P + 1/2) P. A difference beyond
     the range makes what follows infinite or NaN. The code stands in *err and is the function
     result.
-    Codes: ErrSizesDisagree (x is empty). */
+    Codes: ErrSizesDisagree (x is empty).
+    NaN: x in all results or in some results. */
 QX_API ErrorCode unWrap(QX_INOUT DBL1D x, QX_OUT ErrorCode *err);
 /** As unWrap, in units of the caller's choice. mode: 0 radians; 1 radians in and degrees out; 2
     degrees; 3 degrees in and radians out. Angles beyond 5e305 overflow where the unit changes. The

@@ -15,7 +15,8 @@
 QX_BEGIN_DECLS
 
 /** Shuffles x; without bias if `unbiased` is non-zero. A failure empties both arrays.
-    Codes: ErrEmptyInput (x is empty), ErrOutOfMemory (the host refused the resize). */
+    Codes: ErrEmptyInput (x is empty), ErrOutOfMemory (the host refused the resize).
+    NaN: x in some results. */
 QX_API ErrorCode RiffleArrayDBL2012_head(QX_INOUT DBL1D x, QX_OUT I32_1D indices, int32_t seed,
                                          QX_INOUT RandomState *state, int32_t unbiased);
 /** As RiffleArrayDBL2012_head, biased. */

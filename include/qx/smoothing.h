@@ -22,7 +22,8 @@ QX_BEGIN_DECLS
     order), ErrSizeMismatch (weights are there, but not as many as the frame has samples),
     ErrBadTapCount (frame is even), ErrOutOfMemory (no memory, or the host refuses an output),
     ErrNonFiniteInput (a weight is NaN or infinite, or the powers overflow), ErrSingularMatrix (the
-    factor is refused). */
+    factor is refused).
+    NaN: weights refused with ErrNonFiniteInput. */
 QX_API ErrorCode SavitzkyGolayCoefH(int32_t order, int32_t frame, QX_IN DBL1D weights,
                                     int32_t wantDifferentiators, QX_OUT DBL2D smoothing,
                                     QX_OUT DBL2D differentiators);
@@ -34,7 +35,8 @@ QX_API ErrorCode SavitzkyGolayCoefH(int32_t order, int32_t frame, QX_IN DBL1D we
     order), ErrSizeMismatch (weights are there, but not as many as the frame has samples),
     ErrOutOfMemory (no memory, or the host refuses y), ErrBadTapCount (frame is even),
     ErrSizesDisagree (x is shorter than the frame), ErrNonFiniteInput (a weight is NaN or infinite,
-    or the powers overflow), ErrSingularMatrix (as of SavitzkyGolayCoefH). */
+    or the powers overflow), ErrSingularMatrix (as of SavitzkyGolayCoefH).
+    NaN: x in some results; weights refused with ErrNonFiniteInput. */
 QX_API ErrorCode SavitzkyGolayFiltH(QX_IN DBL1D x, int32_t order, int32_t frame,
                                     QX_IN DBL1D weights, QX_OUT DBL1D y);
 
@@ -42,14 +44,16 @@ QX_API ErrorCode SavitzkyGolayFiltH(QX_IN DBL1D x, int32_t order, int32_t frame,
     before and behind x. An empty x stays empty. The code is in *err. Among zeros of either sign the
     older one counts as the smaller. NaN brings the window into disorder, also for what comes later.
     Codes: ErrNegativeCount (*rank is below 0), ErrSizesDisagree (x is not longer than *rank),
-    ErrOutOfMemory (no memory). */
+    ErrOutOfMemory (no memory).
+    NaN: x in no result. */
 QX_API int32_t MedianFilterCIN(QX_INOUT DBL1D x, QX_IN const int32_t *rank, QX_OUT ErrorCode *err);
 
 /** Running median in place, of x[i - leftRank] to x[i + rightRank]; of an even number of values it
     is the mean of the two in the middle. A rightRank below 0 is leftRank. Otherwise as
     MedianFilterCIN.
     Codes: ErrNegativeCount (leftRank is below 0), ErrSizesDisagree (x is not longer than
-    rightRank), ErrOutOfMemory (no memory). */
+    rightRank), ErrOutOfMemory (no memory).
+    NaN: x in some results or in no result. */
 QX_API ErrorCode MedianFilter81_H(QX_INOUT DBL1D x, int32_t leftRank, int32_t rightRank);
 
 QX_END_DECLS

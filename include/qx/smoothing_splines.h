@@ -31,7 +31,9 @@ QX_BEGIN_DECLS
     length), ErrInvalidSelector (method), ErrNonFiniteInput (an array or parameter),
     ErrNotStrictlyPositive (a deviation), ErrNegativeSetting (parameter of methods 1 and 2 below
     0 or NaN), ErrAbscissaeOrder (x does not ascend), ErrOutOfMemory (no memory, more than 29
-    million samples, or an array cannot be resized). */
+    million samples, or an array cannot be resized).
+    NaN: x, y, deviations refused with ErrNonFiniteInput; parameter refused with ErrNegativeSetting
+    or in no result. */
 QX_API ErrorCode CubicSplineFit_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D deviations,
                                      int32_t method, double parameter, QX_OUT DBL1D values,
                                      QX_OUT DBL2D coefficients, QX_OUT DBL1D secondDerivatives,
@@ -50,7 +52,8 @@ QX_API ErrorCode CubicSplineFit_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D d
     (an array), ErrAbscissaeOrder (x descends; interiorKnots descend, repeat too often or are
     not strictly inside x[0] to x[n - 1]), ErrPolynomialOrderTooHigh (more coefficients than
     samples, or too few different x with weight under a B-spline), ErrOutOfMemory (no memory, or
-    an array cannot be resized). */
+    an array cannot be resized).
+    NaN: x, y, w, interiorKnots refused with ErrNonFiniteInput. */
 QX_API ErrorCode BSplineFit_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D w, int32_t degree,
                                  int32_t interior, QX_IN DBL1D interiorKnots, QX_OUT DBL1D knots,
                                  QX_OUT DBL1D coefficients, QX_OUT DBL1D values,

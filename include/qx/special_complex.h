@@ -23,7 +23,8 @@ QX_BEGIN_DECLS
     Codes: ErrBesselStatusOne (order or z is NaN or infinite, or z is 0 and the order is negative
     and no integer), ErrBesselStatusFour (|z| or |order| is above 2^31: no digit can be relied on),
     ErrOverflow (the result exceeds the range), WarnLowAccuracy (|z| or |order| is above 4.7e7, so
-    that the rounding of the arguments leaves less than half the digits). */
+    that the rounding of the arguments leaves less than half the digits).
+    NaN: order, z.im, z.re refused with ErrBesselStatusOne. */
 QX_API ErrorCode QX_CxBesselJr(double order, QX_IN const CDB *z, int32_t scaled,
                                QX_OUT CDB *result);
 
@@ -31,7 +32,8 @@ QX_API ErrorCode QX_CxBesselJr(double order, QX_IN const CDB *z, int32_t scaled,
     whole orders the limit (9.1.2). scaled other than 0 multiplies by exp(-|Im z|).
     Codes: ErrBesselStatusOne (order or z is NaN or infinite, or z is 0), ErrBesselStatusFour (|z|
     or |order| is above 2^31), ErrOverflow (the result exceeds the range), WarnLowAccuracy (|z| or
-    |order| is above 4.7e7). */
+    |order| is above 4.7e7).
+    NaN: order, z.im, z.re refused with ErrBesselStatusOne. */
 QX_API ErrorCode QX_CxBesselYr(double order, QX_IN const CDB *z, int32_t scaled,
                                QX_OUT CDB *result);
 
@@ -39,7 +41,8 @@ QX_API ErrorCode QX_CxBesselYr(double order, QX_IN const CDB *z, int32_t scaled,
     (9.6). scaled other than 0 multiplies by exp(-|Re z|).
     Codes: ErrBesselStatusOne (order or z is NaN or infinite, or z is 0 and the order is negative
     and no integer), ErrBesselStatusFour (|z| or |order| is above 2^31), ErrOverflow (the result
-    exceeds the range), WarnLowAccuracy (|z| or |order| is above 4.7e7). */
+    exceeds the range), WarnLowAccuracy (|z| or |order| is above 4.7e7).
+    NaN: order, z.im, z.re refused with ErrBesselStatusOne. */
 QX_API ErrorCode QX_CxBesselIr(double order, QX_IN const CDB *z, int32_t scaled,
                                QX_OUT CDB *result);
 
@@ -47,7 +50,8 @@ QX_API ErrorCode QX_CxBesselIr(double order, QX_IN const CDB *z, int32_t scaled,
     whole orders the limit (9.6.2). scaled other than 0 multiplies by exp(z).
     Codes: ErrBesselStatusOne (order or z is NaN or infinite, or z is 0), ErrBesselStatusFour (|z|
     or |order| is above 2^31), ErrOverflow (the result exceeds the range), WarnLowAccuracy (|z| or
-    |order| is above 4.7e7). */
+    |order| is above 4.7e7).
+    NaN: order, z.im, z.re refused with ErrBesselStatusOne. */
 QX_API ErrorCode QX_CxBesselKr(double order, QX_IN const CDB *z, int32_t scaled,
                                QX_OUT CDB *result);
 
@@ -55,7 +59,8 @@ QX_API ErrorCode QX_CxBesselKr(double order, QX_IN const CDB *z, int32_t scaled,
     multiplies by exp(-i z).
     Codes: ErrBesselStatusOne (order or z is NaN or infinite, or z is 0), ErrBesselStatusFour (|z|
     or |order| is above 2^31), ErrOverflow (the result exceeds the range), WarnLowAccuracy (|z| or
-    |order| is above 4.7e7). */
+    |order| is above 4.7e7).
+    NaN: order, z.im, z.re refused with ErrBesselStatusOne. */
 QX_API ErrorCode QX_CxBesselH1r(double order, QX_IN const CDB *z, int32_t scaled,
                                 QX_OUT CDB *result);
 
@@ -63,14 +68,16 @@ QX_API ErrorCode QX_CxBesselH1r(double order, QX_IN const CDB *z, int32_t scaled
     multiplies by exp(i z).
     Codes: ErrBesselStatusOne (order or z is NaN or infinite, or z is 0), ErrBesselStatusFour (|z|
     or |order| is above 2^31), ErrOverflow (the result exceeds the range), WarnLowAccuracy (|z| or
-    |order| is above 4.7e7). */
+    |order| is above 4.7e7).
+    NaN: order, z.im, z.re refused with ErrBesselStatusOne. */
 QX_API ErrorCode QX_CxBesselH2r(double order, QX_IN const CDB *z, int32_t scaled,
                                 QX_OUT CDB *result);
 
 /** Airy function Ai, the solution of w'' = z w that falls along the positive axis (10.4). With zeta
     = 2/3 z sqrt(z), scaled other than 0 multiplies by exp(zeta), which has a cut that Ai has not.
     Codes: ErrBesselStatusOne (z is NaN or infinite), ErrBesselStatusFour (|zeta| is above 2^31),
-    ErrOverflow (the result exceeds the range), WarnLowAccuracy (|zeta| is above 4.7e7). */
+    ErrOverflow (the result exceeds the range), WarnLowAccuracy (|zeta| is above 4.7e7).
+    NaN: z.im, z.re refused with ErrBesselStatusOne. */
 QX_API ErrorCode QX_CxAiryAi(QX_IN const CDB *z, int32_t scaled, QX_OUT CDB *result);
 
 /** As QX_CxAiryAi, the derivative of Ai. */
@@ -79,7 +86,8 @@ QX_API ErrorCode QX_CxAiryAiP(QX_IN const CDB *z, int32_t scaled, QX_OUT CDB *re
 /** Airy function Bi, the solution of w'' = z w that is in quadrature to Ai on the negative axis
     (10.4). With zeta = 2/3 z sqrt(z), scaled other than 0 multiplies by exp(-|Re zeta|).
     Codes: ErrBesselStatusOne (z is NaN or infinite), ErrBesselStatusFour (|zeta| is above 2^31),
-    ErrOverflow (the result exceeds the range), WarnLowAccuracy (|zeta| is above 4.7e7). */
+    ErrOverflow (the result exceeds the range), WarnLowAccuracy (|zeta| is above 4.7e7).
+    NaN: z.im, z.re refused with ErrBesselStatusOne. */
 QX_API ErrorCode QX_CxAiryBi(QX_IN const CDB *z, int32_t scaled, QX_OUT CDB *result);
 
 /** As QX_CxAiryBi, the derivative of Bi. */

@@ -12,24 +12,29 @@ QX_BEGIN_DECLS
 /** Elliptic integral of the first kind by its parameter m = k^2: complete, K(m) = F(pi / 2, m),
     where phi is NaN, else F(phi, m), the integral of (1 - m sin^2(t))^(-1/2) from 0 to phi
     (17.2). Complete by a rational form and the logarithm of 1 - m, incomplete by Landen's
-    descending transformation (17.6.8). NaN for m outside [0, 1]. */
+    descending transformation (17.6.8). NaN for m outside [0, 1].
+    NaN: m in all results; phi in no result. */
 QX_API void QX_Elliptic1(double m, double phi, QX_OUT DBL *value);
 
-/** As QX_Elliptic1, with a selector for what a NaN says there: 1 complete, otherwise incomplete. */
+/** As QX_Elliptic1, with a selector for what a NaN says there: 1 complete, otherwise incomplete.
+    NaN: m in all results; phi in some results. */
 QX_API void QX_Elliptic1_85(double m, double phi, QX_OUT DBL *value, int32_t selector);
 
 /** Elliptic integral of the second kind: complete, E(m), where phi is NaN, else E(phi, m), the
     integral of (1 - m sin^2(t))^(1/2) from 0 to phi, by the same methods. NaN for m outside [0,
-    1]. */
+    1].
+    NaN: m in all results; phi in no result. */
 QX_API void QX_Elliptic2(double m, double phi, QX_OUT DBL *value);
 
-/** As QX_Elliptic2, with a selector for what a NaN says there: 1 complete, otherwise incomplete. */
+/** As QX_Elliptic2, with a selector for what a NaN says there: 1 complete, otherwise incomplete.
+    NaN: m in all results; phi in some results. */
 QX_API void QX_Elliptic2_85(double m, double phi, QX_OUT DBL *value, int32_t selector);
 
 /** Jacobian elliptic functions sn = sin(phi), cn = cos(phi), dn = (1 - m sn^2)^(1/2) of u with
     parameter m, and the amplitude phi, for which F(phi, m) = u: by arithmetic-geometric means
     (16.4), next to m = 0 and m = 1 by circular and hyperbolic functions (16.13, 16.15). Each
-    pointer may be null. NaN for m outside [0, 1]. */
+    pointer may be null. NaN for m outside [0, 1].
+    NaN: u, m in all results. */
 QX_API void QX_EllipticJ(double u, double m, QX_OUT DBL *sn, QX_OUT DBL *cn, QX_OUT DBL *dn,
                          QX_OUT DBL *phi);
 

@@ -25,7 +25,8 @@ QX_BEGIN_DECLS
     0, -1, -2, ... and the series does not end before. The limit form is summed to 1.8e-11; both
     forms in 1 - x lose digits like x^(1-c) where c is large and x below 0.5, and where an infinity
     arises within them they give NaN. Series that end are summed in their order, whose terms
-    alternate for x > 0: beyond 32 of them, or with parameters beyond 40, no digit may be left. */
+    alternate for x > 0: beyond 32 of them, or with parameters beyond 40, no digit may be left.
+    NaN: x, a, b, c in all results. */
 QX_API void QX_Gauss(double x, double a, double b, double c, QX_OUT DBL *value);
 
 /** As QX_Gauss, with Pfaff's transformation for all x < 0.2, where its argument lies in [-0.25,
@@ -45,7 +46,8 @@ QX_API void QX_Gauss_2011(double x, double a, double b, double c, QX_OUT DBL *va
 
     exp(x) for a and b both infinite or equal; 1 for a = 0 and for x = 0; +infinity at x = +infinity
     for finite a and b; NaN for a NaN, for a and x both infinite, for b = 0, -1, -2, ... unless the
-    series ends before. */
+    series ends before.
+    NaN: x, a, b in all results. */
 QX_API void QX_Kummer(double x, double a, double b, QX_OUT DBL *value);
 
 /** Tricomi's confluent hypergeometric function U(a, b, x).
@@ -56,7 +58,8 @@ QX_API void QX_Kummer(double x, double a, double b, QX_OUT DBL *value);
     b - 0.0005 and b + 0.0005, which is right to about six digits.
 
     NaN where an argument is NaN or infinite and for x < 0; +infinity at x = 0, also where the limit
-    is finite. */
+    is finite.
+    NaN: x, a, b in all results. */
 QX_API void QX_Tricomi(double x, double a, double b, QX_OUT DBL *value);
 
 QX_END_DECLS

@@ -17,7 +17,8 @@ QX_BEGIN_DECLS
     diagonal. What a kind does not need is not looked at.
     Codes: ErrInvalidSelector (*kind is not 0 to 4), ErrEmptyInput (kinds 0 to 3: the size is below
     1), ErrFewerThanTwo (kind 4: x has fewer than 2 elements), ErrOutOfMemory (the host refused
-    the resize). */
+    the resize).
+    NaN: x, y in some results or in no result. */
 QX_API int32_t SpecialMatrix_head(QX_IN const int32_t *kind, QX_IN const int32_t *size,
                                   QX_IN DBL1D x, QX_IN DBL1D y, QX_OUT DBL2D out,
                                   QX_OUT ErrorCode *err);
@@ -27,7 +28,8 @@ QX_API int32_t CxSpecialMatrix_head(QX_IN const int32_t *kind, QX_IN const int32
                                     QX_OUT ErrorCode *err);
 
 /** out[i][j] = x[i] y[j].
-    Codes: ErrEmptyInput (x or y is empty), ErrOutOfMemory (the host refused the resize). */
+    Codes: ErrEmptyInput (x or y is empty), ErrOutOfMemory (the host refused the resize).
+    NaN: x, y in some results. */
 QX_API int32_t OuterProd_head(QX_IN DBL1D x, QX_IN DBL1D y, QX_OUT DBL2D out,
                               QX_OUT ErrorCode *err);
 /** As OuterProd_head, for complex data; nothing is conjugated. */
@@ -36,7 +38,8 @@ QX_API int32_t OuterProdCx_head(QX_IN CDB1D x, QX_IN CDB1D y, QX_OUT CDB2D out,
 
 /** Kronecker product: the block in place of a[i][j] is a[i][j] b.
     Codes: ErrEmptyInput (a or b is empty), ErrOutOfMemory (the host refused the resize, or it
-    passes 2^31 rows or columns). */
+    passes 2^31 rows or columns).
+    NaN: a, b in some results. */
 QX_API ErrorCode KroneckerProd_H(QX_IN DBL2D a, QX_IN DBL2D b, QX_OUT DBL2D out);
 /** As KroneckerProd_H, for complex data. */
 QX_API ErrorCode CxKroneckerProd_H(QX_IN CDB2D a, QX_IN CDB2D b, QX_OUT CDB2D out);
@@ -44,7 +47,8 @@ QX_API ErrorCode CxKroneckerProd_H(QX_IN CDB2D a, QX_IN CDB2D b, QX_OUT CDB2D ou
 /** A packed triangle as a full square matrix: of triangle 0 and 1 the other triangle is 0, of 2 it
     is the mirror image. Any other triangle leaves out as it is, with success.
     Codes: ErrEmptyInput (packed is empty), ErrNotSquare (its length is no n (n+1) / 2),
-    ErrOutOfMemory (the host refused the resize). */
+    ErrOutOfMemory (the host refused the resize).
+    NaN: a.packed in some results. */
 QX_API int32_t Compact_to_Matrix_head(QX_IN const PackedTriangle *a, QX_OUT DBL2D out,
                                       QX_OUT ErrorCode *err);
 /** As Compact_to_Matrix_head, for complex data; the mirror image is not conjugated. */
@@ -55,7 +59,8 @@ QX_API int32_t CxCompact_to_Matrix_head(QX_IN const CxPackedTriangle *a, QX_OUT 
     lower one.
     Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrInvalidSelector
     (*triangle is not 0, 1 or 2), ErrOutOfMemory (the host refused the resize, or the packed length
-    passes 2^31). */
+    passes 2^31).
+    NaN: a in some results or in no result. */
 QX_API int32_t Matrix_to_Compact_head(QX_IN DBL2D a, QX_IN const int32_t *triangle,
                                       QX_OUT DBL1D packed, QX_OUT ErrorCode *err);
 /** As Matrix_to_Compact_head, for complex data. */
@@ -64,17 +69,20 @@ QX_API int32_t CxMatrix_to_Compact_head(QX_IN CDB2D a, QX_IN const int32_t *tria
 
 /** Packed storage of a symmetric matrix, as fits give it, as a full square matrix.
     Codes: ErrEmptyInput (packed is empty), ErrNotSquare (its length is no n (n+1) / 2),
-    ErrOutOfMemory (the host refused the resize). */
+    ErrOutOfMemory (the host refused the resize).
+    NaN: packed in some results. */
 QX_API ErrorCode CompactToMatrix_H(QX_IN DBL1D packed, QX_OUT DBL2D out);
 
 /** The lower triangle of a square matrix in packed storage, as fits take it.
     Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrOutOfMemory (the host
-    refused the resize, or the packed length passes 2^31). */
+    refused the resize, or the packed length passes 2^31).
+    NaN: a in some results. */
 QX_API ErrorCode MatrixToCompact_H(QX_IN DBL2D a, QX_OUT DBL1D packed);
 
 /** Transpose.
     Codes: ErrEmptyInput (a is empty), ErrOutOfMemory (no memory, or the host refused the
-    resize). */
+    resize).
+    NaN: a in some results. */
 QX_API ErrorCode Transpose_head(QX_IN DBL2D a, QX_OUT DBL2D out);
 
 /** As Transpose_head, for complex data, without conjugation and with the code in *err. */
@@ -89,7 +97,8 @@ QX_API ErrorCode CxInitialMatrixH(int32_t rows, int32_t cols, QX_OUT CDB2D out);
 
 /** A full symmetric matrix with the given eigenvalues: Q diag(values) Q with the reflection Q = 1
     - (2/n) e e^T, e being all ones.
-    Codes: ErrEmptyInput (values is empty), ErrOutOfMemory (the host refused the resize). */
+    Codes: ErrEmptyInput (values is empty), ErrOutOfMemory (the host refused the resize).
+    NaN: values in all results. */
 QX_API int32_t CreateMatrixFromEVs_head(QX_IN DBL1D values, QX_OUT DBL2D out,
                                         QX_OUT ErrorCode *err);
 
@@ -98,7 +107,8 @@ QX_API int32_t CreateMatrixFromEVs_head(QX_IN DBL1D values, QX_OUT DBL2D out,
    autocorrelation matrix, symmetric or Hermitian. Codes: ErrEmptyInput (x or y is empty),
    ErrSizeMismatch (the lengths differ), ErrIndexOutOfRange (maxLag is below 0 or not below n),
    ErrInvalidSelector (normalization is not 0, 1 or 2), ErrOutOfMemory (no memory, or the host
-   refused the resize). */
+   refused the resize).
+    NaN: x, y in some results. */
 QX_API ErrorCode AutoCorrMtrxH(QX_IN DBL1D x, QX_IN DBL1D y, int32_t maxLag, int32_t normalization,
                                QX_OUT DBL2D out);
 /** As AutoCorrMtrxH, for complex data. */

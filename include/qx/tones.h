@@ -33,7 +33,8 @@ QX_BEGIN_DECLS
     Codes: ErrMeasureEmpty (y is empty), ErrSamplingNotPositive (dt is not a positive finite
     number), ErrMeasureBadCount (count is below 1), ErrInvalidSelector (order), ErrNonFiniteInput
     (y), ErrMeasureTooFewPoints (fewer than 4 samples), ErrMeasureNotFound (nothing but a constant),
-    ErrOutOfMemory (no memory, or an array cannot be resized). */
+    ErrOutOfMemory (no memory, or an array cannot be resized).
+    NaN: y refused with ErrNonFiniteInput; dt refused with ErrSamplingNotPositive. */
 QX_API ErrorCode MultipleToneMeasurements(QX_IN DBL1D y, double dt, int32_t count, int32_t order,
                                           QX_OUT DBL1D frequencies, QX_OUT DBL1D amplitudes,
                                           QX_OUT DBL1D phases, QX_OUT double *residualRms);
@@ -47,7 +48,9 @@ QX_API ErrorCode MultipleToneMeasurements(QX_IN DBL1D y, double dt, int32_t coun
     Codes: ErrMeasureEmpty (y is empty), ErrSamplingNotPositive (dt is not a positive finite
     number), ErrNonFiniteInput (y, centre or halfWidth), ErrMeasureTooFewPoints (fewer than 4
     samples), ErrMeasureNotFound (nothing but a constant, or nothing in the band), ErrOutOfMemory
-    (no memory). */
+    (no memory).
+    NaN: y, centre, halfWidth refused with ErrNonFiniteInput; dt refused with
+    ErrSamplingNotPositive. */
 QX_API ErrorCode SingleToneMeasurement(QX_IN DBL1D y, double dt, double centre, double halfWidth,
                                        QX_OUT double *frequency, QX_OUT double *amplitude,
                                        QX_OUT double *phase, QX_OUT double *offset,
@@ -81,7 +84,9 @@ QX_API ErrorCode SingleToneMeasurement(QX_IN DBL1D y, double dt, double centre, 
     number), ErrMeasureBadCount (highestHarmonic is below 1), ErrNonFiniteInput (y, fundamental or
     fullScale), ErrMeasureTooFewPoints (fewer than 4 samples, or than 2 highestHarmonic + 2),
     ErrMeasureNotFound (nothing but a constant, or no tone near `fundamental`), ErrOutOfMemory (no
-    memory, or an array cannot be resized). */
+    memory, or an array cannot be resized).
+    NaN: y, fundamental, fullScale refused with ErrNonFiniteInput; dt refused with
+    ErrSamplingNotPositive. */
 QX_API ErrorCode HarmonicAnalysis(QX_IN DBL1D y, double dt, double fundamental,
                                   int32_t highestHarmonic, double fullScale,
                                   QX_OUT DBL1D frequencies, QX_OUT DBL1D amplitudes,

@@ -37,12 +37,15 @@ typedef struct TriggerState {
     Codes: ErrMeasureEmpty (y is empty), ErrInvalidSelector (slope), ErrIndexOutOfRange (start is
     below 0 or above the size of y, which itself finds nothing), ErrNegativeSetting (hysteresis or
     holdoff is negative, or hysteresis is NaN), ErrNonFiniteInput (level, hysteresis, or a sample
-    that is looked at). */
+    that is looked at).
+    NaN: y, level refused with ErrNonFiniteInput; hysteresis refused with ErrNegativeSetting;
+    state.last in no result. */
 QX_API ErrorCode Triggerh_86(QX_IN DBL1D y, double level, double hysteresis, int32_t slope,
                              int32_t start, int32_t holdoff, QX_INOUT TriggerState *state,
                              QX_OUT int32_t *index, QX_OUT double *position);
 
-/** As Triggerh_86, with hysteresis 0, holdoff 0 and a state of zeros. */
+/** As Triggerh_86, with hysteresis 0, holdoff 0 and a state of zeros.
+    NaN: y refused with ErrNonFiniteInput or in no result; level refused with ErrNonFiniteInput. */
 QX_API ErrorCode Triggerh(QX_IN DBL1D y, double level, int32_t slope, int32_t start,
                           QX_OUT int32_t *index, QX_OUT double *position);
 

@@ -23,25 +23,29 @@ QX_BEGIN_DECLS
 /** Sine wave amp sin(p), by the recurrence y[i] = y[i-2] + 2 sin(w) c[i-1] of sine and cosine with
     w = 2 pi f, each sample clipped to [-|amp|, |amp|]: the recurrence is not stable in amplitude,
     and the error grows with the length of a block and, for w near a multiple of pi, fast.
-    Codes: ErrEmptyInput (*n is below 1), ErrOutOfMemory (the host refused the resize). */
+    Codes: ErrEmptyInput (*n is below 1), ErrOutOfMemory (the host refused the resize).
+    NaN: amp, phase in all results; f in some results. */
 QX_API int32_t SineWaveCIN(QX_OUT DBL1D x, QX_IN const int32_t *n, QX_IN const double *amp,
                            QX_IN const double *f, QX_INOUT double *phase, QX_OUT ErrorCode *err);
 
 /** Square wave: amp while p is below 3.6 duty, else -amp; duty in per cent, clamped to 0 to 100.
-    Codes: ErrEmptyInput (*n is below 1), ErrOutOfMemory (the host refused the resize). */
+    Codes: ErrEmptyInput (*n is below 1), ErrOutOfMemory (the host refused the resize).
+    NaN: amp in all results; f, phase, duty in no result. */
 QX_API int32_t SquareWaveCIN(QX_OUT DBL1D x, QX_IN const int32_t *n, QX_IN const double *amp,
                              QX_IN const double *f, QX_INOUT double *phase,
                              QX_IN const double *duty, QX_OUT ErrorCode *err);
 
 /** Triangle wave: 0 at p = 0, amp at 90, 0 at 180, -amp at 270 degrees.
-    Codes: ErrEmptyInput (*n is below 1), ErrOutOfMemory (the host refused the resize). */
+    Codes: ErrEmptyInput (*n is below 1), ErrOutOfMemory (the host refused the resize).
+    NaN: amp, f, phase in all results. */
 QX_API int32_t TriangleWaveCIN(QX_OUT DBL1D x, QX_IN const int32_t *n, QX_IN const double *amp,
                                QX_IN const double *f, QX_INOUT double *phase,
                                QX_OUT ErrorCode *err);
 
 /** Sawtooth wave: amp p / 180 below 180 degrees, from there amp (p / 180 - 2); it jumps from amp to
     -amp at 180.
-    Codes: ErrEmptyInput (*n is below 1), ErrOutOfMemory (the host refused the resize). */
+    Codes: ErrEmptyInput (*n is below 1), ErrOutOfMemory (the host refused the resize).
+    NaN: amp, f, phase in all results. */
 QX_API int32_t SawtoothWaveCIN(QX_OUT DBL1D x, QX_IN const int32_t *n, QX_IN const double *amp,
                                QX_IN const double *f, QX_INOUT double *phase,
                                QX_OUT ErrorCode *err);
@@ -50,20 +54,24 @@ QX_API int32_t SawtoothWaveCIN(QX_OUT DBL1D x, QX_IN const int32_t *n, QX_IN con
     linearly between the two around it if *interpolate is 1. The position in the table is a running
     sum. An empty table gives zeros and the phase 0.
     Codes: ErrEmptyInput (*n is below 1), ErrOutOfMemory (the host refused the resize),
-    ErrNonFiniteInput (phase or f is not finite, or the position would overflow). */
+    ErrNonFiniteInput (phase or f is not finite, or the position would overflow).
+    NaN: amp in all results; f, phase refused with ErrNonFiniteInput; table in all results or in
+    some results or in no result. */
 QX_API int32_t ArbitraryWaveCIN(QX_OUT DBL1D x, QX_IN const int32_t *n, QX_IN const double *amp,
                                 QX_IN const double *f, QX_INOUT double *phase, QX_IN DBL1D table,
                                 QX_IN const int32_t *interpolate, QX_OUT ErrorCode *err);
 
 /** Linear chirp amp sin(i ((f2 - f1) pi/n i + 2 pi f1)): the frequency goes from f1 at the first
     sample to f2 at sample n, which is one behind the last.
-    Codes: ErrEmptyInput (*n is below 1), ErrOutOfMemory (the host refused the resize). */
+    Codes: ErrEmptyInput (*n is below 1), ErrOutOfMemory (the host refused the resize).
+    NaN: amp, f1, f2 in all results. */
 QX_API int32_t ChirpCIN(QX_OUT DBL1D x, QX_IN const int32_t *n, QX_IN const double *amp,
                         QX_IN const double *f1, QX_IN const double *f2, QX_OUT ErrorCode *err);
 
 /** `cycles` periods of a sine over the array, which need not be whole, from the phase in degrees;
     computed as SineWaveCIN is.
-    Codes: ErrEmptyInput (*n is below 1), ErrOutOfMemory (the host refused the resize). */
+    Codes: ErrEmptyInput (*n is below 1), ErrOutOfMemory (the host refused the resize).
+    NaN: amp, phase in all results; cycles in some results. */
 QX_API int32_t SinePtrn(QX_OUT DBL1D x, QX_IN const int32_t *n, QX_IN const double *amp,
                         QX_IN const double *phase, QX_IN const double *cycles,
                         QX_OUT ErrorCode *err);
@@ -72,32 +80,38 @@ QX_API int32_t SinePtrn(QX_OUT DBL1D x, QX_IN const int32_t *n, QX_IN const doub
     round(duty period / 100) of amp. At a duty of 100 all samples are amp.
     Codes: ErrEmptyInput (*n is below 1), ErrWaveParameterNotPositive (the duty is not above 0),
     ErrWaveParameterRange (cycles is not above 0 or exceeds the whole half of n), ErrOutOfMemory
-   (the host refused the resize). */
+   (the host refused the resize).
+    NaN: amp in some results; duty refused with ErrWaveParameterNotPositive; cycles refused with
+    ErrWaveParameterRange. */
 QX_API int32_t Square(QX_OUT DBL1D x, QX_IN const int32_t *n, QX_IN const double *amp,
                       QX_IN const double *duty, QX_IN const double *cycles, QX_OUT ErrorCode *err);
 
 /** `width` samples of amp from sample `delay` on, the others 0.
     Codes: ErrEmptyInput (*n is below 1), ErrOutOfMemory (the host refused the resize),
-    ErrPulseOutOfRange (delay or width is negative, or the pulse ends beyond the array). */
+    ErrPulseOutOfRange (delay or width is negative, or the pulse ends beyond the array).
+    NaN: amp in some results. */
 QX_API int32_t PulsePtrn(QX_OUT DBL1D x, QX_IN const int32_t *n, QX_IN const double *amp,
                          QX_IN const int32_t *delay, QX_IN const int32_t *width,
                          QX_OUT ErrorCode *err);
 
 /** One sample of amp at `delay`, the others 0.
     Codes: ErrEmptyInput (*n is below 1), ErrOutOfMemory (the host refused the resize),
-    ErrIndexOutOfRange (delay lies outside the array). */
+    ErrIndexOutOfRange (delay lies outside the array).
+    NaN: amp in some results. */
 QX_API int32_t ImpulsePtrn(QX_OUT DBL1D x, QX_IN const int32_t *n, QX_IN const double *amp,
                            QX_IN const int32_t *delay, QX_OUT ErrorCode *err);
 
 /** amp sin(x) / x at x = pi (i dt - delay).
     Codes: ErrEmptyInput (*n is below 1), ErrOutOfMemory (the host refused the resize),
-    ErrSamplingNotPositive (dt is not above 0). */
+    ErrSamplingNotPositive (dt is not above 0).
+    NaN: amp, delay in all results; dt refused with ErrSamplingNotPositive. */
 QX_API int32_t SincWave(QX_OUT DBL1D x, QX_IN const int32_t *n, QX_IN const double *amp,
                         QX_IN const double *delay, QX_IN const double *dt, QX_OUT ErrorCode *err);
 
 /** A straight line from start to end, both included.
     Codes: ErrEmptyInput (*n is below 1), ErrFewerThanTwo (*n is 1 and the ends differ),
-    ErrOutOfMemory (the host refused the resize). */
+    ErrOutOfMemory (the host refused the resize).
+    NaN: start, end in some results. */
 QX_API int32_t RampPtrn(QX_OUT DBL1D x, QX_IN const int32_t *n, QX_IN const double *start,
                         QX_IN const double *end, QX_OUT ErrorCode *err);
 
@@ -105,7 +119,8 @@ QX_API int32_t RampPtrn(QX_OUT DBL1D x, QX_IN const int32_t *n, QX_IN const doub
     function result is the code.
     Codes: ErrCountNotPositive (n is below 1 and the end excluded), ErrFewerThanTwo (the end is
     included, n is below 2, and it is not one sample between equal ends), ErrOutOfMemory (the host
-    refused the resize). */
+    refused the resize).
+    NaN: start in all results; end in some results. */
 QX_API ErrorCode RampPtrn80(QX_OUT DBL1D x, int32_t n, double start, double end,
                             int32_t excludeEnd);
 
@@ -113,7 +128,9 @@ QX_API ErrorCode RampPtrn80(QX_OUT DBL1D x, int32_t n, double start, double end,
     Codes: ErrCountNotPositive (n is below 1 and the end excluded), ErrFewerThanTwo (the end is
     included, n is below 2, and it is not one sample between equal ends), ErrInvalidSelector (scale
     is above 1), ErrOutOfMemory (the host refused the resize), ErrNotStrictlyPositive (equal ratios
-    and an end not above 0). */
+    and an end not above 0).
+    NaN: start refused with ErrNotStrictlyPositive or in all results; end refused with
+    ErrNotStrictlyPositive or in some results. */
 QX_API ErrorCode RampPtrn85(QX_OUT DBL1D x, int32_t n, double start, double end, int32_t excludeEnd,
                             int32_t scale);
 
@@ -123,7 +140,9 @@ QX_API ErrorCode RampPtrn85(QX_OUT DBL1D x, int32_t n, double start, double end,
     function result is the code.
     Codes: ErrEmptyInput (x is empty and n below 1), ErrOutOfMemory (the host refused the resize),
     ErrNotStrictlyPositive (fc, bandwidth or dBReference is not above 0), ErrSamplingNotPositive (dt
-    is not above 0). */
+    is not above 0).
+    NaN: x in some results; amp in all results; delay in all results or in no result; dt refused
+    with ErrSamplingNotPositive; fc, bandwidth, dBReference refused with ErrNotStrictlyPositive. */
 QX_API ErrorCode GaussPulseH(QX_INOUT DBL1D x, int32_t n, double amp, double delay, double dt,
                              double fc, double bandwidth, double dBReference);
 
@@ -138,14 +157,17 @@ QX_API ErrorCode GaussMonopulseH(QX_INOUT DBL1D x, int32_t n, double dt, double 
     uniform times it begins at t = 0; on times of the caller's it is centred on t = 0.
     Codes: ErrEmptyInput (x is empty and n below 1), ErrOutOfMemory (the host refused the resize),
     ErrNotStrictlyPositive (the width is not above 0), ErrSamplingNotPositive (dt is not above 0),
-    ErrProbabilityOutOfRange (skew does not lie in 0 to 1). */
+    ErrProbabilityOutOfRange (skew does not lie in 0 to 1).
+    NaN: x, amp, skew in some results; delay in all results or in no result; dt refused with
+    ErrSamplingNotPositive; width refused with ErrNotStrictlyPositive. */
 QX_API ErrorCode AperiodTriangleH(QX_INOUT DBL1D x, int32_t n, double amp, double delay, double dt,
                                   double width, double skew);
 
 /** As GaussPulseH, the periodic sinc amp sin(order t/2) / (order sin(t/2)), with its limit where
     sin(t/2) vanishes: amp, or -amp at odd multiples of 2 pi for an even order.
     Codes: ErrEmptyInput (x is empty and n below 1), ErrOutOfMemory (the host refused the resize),
-    ErrNotStrictlyPositive (the order is below 1), ErrSamplingNotPositive (dt is not above 0). */
+    ErrNotStrictlyPositive (the order is below 1), ErrSamplingNotPositive (dt is not above 0).
+    NaN: x, delay in no result; amp in all results; dt refused with ErrSamplingNotPositive. */
 QX_API ErrorCode PeriodicSincH(QX_INOUT DBL1D x, int32_t n, double amp, int32_t order, double dt,
                                double delay);
 
@@ -154,7 +176,8 @@ QX_API ErrorCode PeriodicSincH(QX_INOUT DBL1D x, int32_t n, double amp, int32_t 
     subtracted once *phase reaches it and otherwise added. A dt of 0, or a phase whose product with
     dt is not finite, gives NaN. *peak is the input of largest magnitude so far, by whole parts.
     *phaseOut is *phase dt in degrees plus the last output. Without samples the last output counts
-    as 0. The function result is 0. */
+    as 0. The function result is 0.
+    NaN: dt, fc, phase in all results; peak in no result. */
 QX_API int32_t PhasMod(int32_t n, double dt, QX_OUT double *phaseOut, double fc,
                        QX_INOUT QX_LENGTH(n) DBL *y, QX_INOUT double *peak, QX_INOUT double *phase);
 

@@ -11,7 +11,8 @@ QX_BEGIN_DECLS
 /** The constants of the window held in an array, measured in one pass. A window whose sum is 0 has
     an enbw that is infinite, or NaN where all of it is 0; so has one whose sums leave the range of
     double.
-    Codes: ErrEmptyInput (window is empty). Both constants are then NaN. */
+    Codes: ErrEmptyInput (window is empty). Both constants are then NaN.
+    NaN: window in no result. */
 QX_API ErrorCode NumWinConstH(QX_IN DBL1D window, QX_OUT WindowConstants *constants);
 /** The constants of a named window of n samples. selector: as SymmWinH. For selectors up to 11 they
     are stored values, for the others measured ones, over the whole window in 8 n bytes of scratch
@@ -19,7 +20,8 @@ QX_API ErrorCode NumWinConstH(QX_IN DBL1D window, QX_OUT WindowConstants *consta
     stands; that of selector 61 is a linear ratio. With code 0 constants are NaN where the window is
     (a parameter out of its range), and enbw for the triangle of a single sample, which is 0.
     Codes: ErrEmptyInput (n is below 1), ErrOutOfMemory (no scratch memory or no plan),
-    ErrInvalidSelector (another selector). Both constants are then NaN. */
+    ErrInvalidSelector (another selector). Both constants are then NaN.
+    NaN: param in no result. */
 QX_API ErrorCode WinConstByNameH(int32_t n, int32_t selector, double param,
                                  QX_OUT WindowConstants *constants);
 /** As WinConstByNameH, with the parameter taken as AllWinH takes it: a NaN, for selectors 61 and 62

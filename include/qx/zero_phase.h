@@ -15,7 +15,9 @@ QX_BEGIN_DECLS
     filter, without both x stays as it is. keepState 0 clears the states.
     Codes: ErrEmptyInput (x is empty), ErrSizesDisagree (a without b), the host's status (it
     refuses a state), ErrOutOfMemory (no memory). A failure leaves x as it is; the last two empty
-    all four states. */
+    all four states.
+    NaN: x, a, b in some results; xStateForward, xStateBackward, yStateForward, yStateBackward in no
+    result. */
 QX_API ErrorCode zeroPhaseFiltH(QX_INOUT DBL1D x, QX_IN DBL1D a, QX_IN DBL1D b,
                                 QX_INOUT DBL1D xStateForward, QX_INOUT DBL1D xStateBackward,
                                 QX_INOUT DBL1D yStateForward, QX_INOUT DBL1D yStateBackward,
@@ -25,7 +27,9 @@ QX_API ErrorCode zeroPhaseFiltH(QX_INOUT DBL1D x, QX_IN DBL1D a, QX_IN DBL1D b,
     x stays as it is. keepState 0 clears the states.
     Codes: ErrEmptyInput (x is empty), ErrSizesDisagree (a without b, or b without a), the host's
     status (it refuses a state), ErrInvalidSelector (no such form), ErrCoefficientSizes (the sizes
-    of a and b do not fit the form), ErrOutOfMemory (no memory). A failure leaves x as it is. */
+    of a and b do not fit the form), ErrOutOfMemory (no memory). A failure leaves x as it is.
+    NaN: x in all results; a in all results or in some results; b in some results; stateForward,
+    stateBackward in no result. */
 QX_API ErrorCode zeroPhaseCascadeFiltH(QX_INOUT DBL1D x, QX_IN const int32_t *form, QX_IN DBL1D a,
                                        QX_IN DBL1D b, QX_INOUT DBL1D stateForward,
                                        QX_INOUT DBL1D stateBackward, int32_t keepState);

@@ -133,8 +133,11 @@ public:
             n = size <= 8 ? std::max(n, size) : n;
         const SpoiltRun as = RunSpoilt(recipe, n, {});
         for (const SpoilPlace &place : as.places) {
-            if (!mayBeNaN(place))
+            const InterceptedArgument &argument = argumentOf(place);
+            if (argument.isOutput || !mayBeNaN(place))
                 continue;
+            if (!argument.isInput && place.dimensions > 0 && isField(place))
+                mayBeOutputs_.insert(place.name);
             int64_t count = 1;
             for (const int32_t size : place.sizes)
                 count *= size;
@@ -148,26 +151,36 @@ public:
         }
     }
 
+    // An array in a record that goes both ways, and of which nothing is seen, counts as an output.
     std::map<std::string, std::string> words() const {
         std::map<std::string, std::string> found;
         for (const auto &[place, outcomes] : seen_)
-            for (const auto &[order, word] : outcomes)
-                found[place] += (found[place].empty() ? "" : " or ") + word;
+            if (mayBeOutputs_.count(place) == 0 || outcomes != std::set<Outcome>{unseen})
+                found[place] = wordsOf(outcomes);
         return found;
     }
 
 private:
     typedef std::pair<int, std::string> Outcome;
+    static inline const Outcome unseen = {1002, "in no result"};
 
-    bool mayBeNaN(const SpoilPlace &place) const {
+    static std::string wordsOf(const std::set<Outcome> &outcomes) {
+        std::string words;
+        for (const auto &[order, word] : outcomes)
+            words += (words.empty() ? "" : " or ") + word;
+        return words;
+    }
+    const InterceptedArgument &argumentOf(const SpoilPlace &place) const {
+        const std::string name = place.name.substr(0, place.name.find('.'));
+        return *std::find_if(target_.arguments.begin(), target_.arguments.end(),
+                             [&](const InterceptedArgument &one) { return one.name == name; });
+    }
+    static bool isField(const SpoilPlace &place) {
+        return place.name.find('.') != std::string::npos;
+    }
+    static bool mayBeNaN(const SpoilPlace &place) {
         const std::string &e = place.element;
-        if (e != "DBL" && e != "SGL" && e != "CDB" && e != "CSG")
-            return false;
-        const std::string argument = place.name.substr(0, place.name.find('.'));
-        for (const InterceptedArgument &one : target_.arguments)
-            if (one.name == argument)
-                return !one.isOutput;
-        return false;
+        return e == "DBL" || e == "SGL" || e == "CDB" || e == "CSG";
     }
     Outcome outcome(const SpoiltRun &as, const SpoiltRun &run) const {
         for (const ErrorCode code : run.codes)
@@ -182,7 +195,7 @@ private:
         };
         const auto nans = count(run);
         if (nans <= count(as))
-            return {1002, "in no result"};
+            return unseen;
         return nans == static_cast<std::ptrdiff_t>(run.numbers.size())
                    ? Outcome{1000, "in all results"}
                    : Outcome{1001, "in some results"};
@@ -190,6 +203,7 @@ private:
 
     const Interceptable &target_;
     std::map<std::string, std::set<Outcome>> seen_;
+    std::set<std::string> mayBeOutputs_;
 };
 
 // The sentence as a header has it: places of the same words together.

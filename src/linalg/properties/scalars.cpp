@@ -86,9 +86,8 @@ double LargestColumnSum(const ConstMatrixView<E> &a) {
 template <ElementType E>
 double Frobenius(const ConstMatrixView<E> &a) {
     double sum = 0.0;
-    for (int32_t i = 0; i < a.rows(); ++i)
-        for (int32_t j = 0; j < a.cols(); ++j)
-            sum += SquaredModulus(a(i, j));
+    for (const ElementOf<E> &element : a.elements())
+        sum += SquaredModulus(element);
     return std::sqrt(sum);
 }
 
