@@ -156,6 +156,23 @@ class TakingOver(unittest.TestCase):
             ("Other", [], False, [])])
 
 
+class NaN(unittest.TestCase):
+    def test_is_read_and_taken_over_where_the_argument_is(self):
+        text = """/** As x is NaN: 0.
+    NaN: x, in.level refused with ErrEmptyInput or
+    in no result; in in some results. More. */ QX_API void first(double x, double in);
+/** As first, elsewhere. */ QX_API void second(double in, double y);
+/** As first. NaN: y in all results. */ QX_API void third(double y);
+/** Not above 0 or NaN: 1e-10. */ QX_API void fourth(double y);
+"""
+        with tempfile.TemporaryDirectory() as folder:
+            exports = catalogue.read_headers(tree(folder, nan=text))["exports"]
+        refused, some = ["refused with ErrEmptyInput", "in no result"], ["in some results"]
+        self.assertEqual([e["nan"] for e in exports], [
+            {"x": refused, "in.level": refused, "in": some}, {"in.level": refused, "in": some},
+            {"y": ["in all results"]}, {}])
+
+
 class Values(unittest.TestCase):
     def test_are_read_from_sentences_and_tables(self):
         text = """/* All of them. kind: 0 plain; 1 round, or (2; 3) so; 7 as x[1] ... x[n].
@@ -214,6 +231,8 @@ class Refusing(unittest.TestCase):
         "'n:' does not end": "\n/** n: 0 a; 1 b */ QX_API void f(int32_t n);",
         "from g, which is no export": "\n/** n: as g. */ QX_API void f(int32_t n);",
         "has no values for n": "\n/** n: as f. */ QX_API void f(int32_t n);",
+        "under 'NaN:'": "\n/** A. NaN: n in three results. */ QX_API void f(double n);",
+        "which is no argument": "\n/** A. NaN: m in no result. */ QX_API void f(double n);",
         "must begin": "\n/** A. */ extern QX_API void f(void);",
         "not marked QX_API": "\n/** A. */ void f(void);",
         "does not end": "\n/** A. */ QX_API void f(void)",

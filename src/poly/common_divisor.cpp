@@ -9,9 +9,8 @@
 namespace qx {
 
 ErrorCode LeastSquaresSystem::allocate(int64_t maxRows, int64_t maxCols) {
-    if (const ErrorCode failed = augmented_.allocate(maxRows * (maxCols + 1)))
-        return failed;
-    return triangle_.allocate(std::min(maxRows, maxCols + 1) * (maxCols + 1));
+    return memory_.take(Sized(augmented_, maxRows * (maxCols + 1)),
+                        Sized(triangle_, std::min(maxRows, maxCols + 1) * (maxCols + 1)));
 }
 
 void LeastSquaresSystem::reset(int32_t rows, int32_t cols) {
@@ -53,9 +52,9 @@ ErrorCode CommonDivisor::allocate(int32_t maxDegree) {
     const int64_t n = maxDegree, size = 2 * n + 2;
     if (const ErrorCode failed = sylvester_.allocate(2 * n, 2 * n))
         return failed;
-    for (Scratch<ElementType::CDB> *const memory : {&slope_, &unknowns_, &step_})
-        if (const ErrorCode failed = memory->allocate(memory == &slope_ ? n : size))
-            return failed;
+    if (const ErrorCode failed =
+            memory_.take(Sized(slope_, n), Sized(unknowns_, size), Sized(step_, size)))
+        return failed;
     return system_.allocate(size, size);
 }
 

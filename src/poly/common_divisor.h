@@ -32,7 +32,8 @@ public:
 
 private:
     std::ptrdiff_t width() const { return cols_ + 1; }
-    Scratch<ElementType::CDB> augmented_, triangle_;
+    ComplexVector augmented_, triangle_;
+    ScratchParts memory_;
     std::ptrdiff_t rows_ = 0, cols_ = 0;
 };
 
@@ -69,7 +70,8 @@ private:
     double residual_ = 0.0;
     const CDB *p_ = nullptr;
     SylvesterMatrices sylvester_;
-    Scratch<ElementType::CDB> slope_, unknowns_, step_;
+    ComplexVector slope_, unknowns_, step_;
+    ScratchParts memory_;
     LeastSquaresSystem system_;
 };
 

@@ -53,11 +53,9 @@ ErrorCode NearestDivisor::assign(const CDB *p, int32_t pCount, const CDB *q, int
     n_ = qCount - 1;
     degree_ = 0;
     const int64_t sum = int64_t{m_} + n_;
-    if (const ErrorCode failed = inputs_.allocate(sum + 2))
+    if (const ErrorCode failed =
+            memory_.take(Sized(inputs_, sum + 2), Sized(unknowns_, sum + 3), Sized(step_, sum + 3)))
         return failed;
-    for (auto *const memory : {&unknowns_, &step_})
-        if (const ErrorCode failed = memory->allocate(sum + 3))
-            return failed;
     Normalise(p, pCount, this->p());
     Normalise(q, qCount, this->q());
     return 0;

@@ -51,7 +51,9 @@ private:
     bool isSwapped_ = false;
     int32_t m_ = 0, n_ = 0, degree_ = 0; // m >= n: the first of the two is the longer
     double distance_ = 0.0;
-    Scratch<ElementType::CDB> inputs_, unknowns_, step_, direction_;
+    ComplexVector inputs_, unknowns_, step_;
+    Scratch<ElementType::CDB> direction_;
+    ScratchParts memory_;
     SylvesterMatrices sylvester_;
     LeastSquaresSystem system_;
 };

@@ -27,13 +27,8 @@ CDB ProductAt(std::ptrdiff_t i, const CDB *a, std::ptrdiff_t degreeA, const CDB 
 
 ErrorCode SylvesterMatrices::allocate(int64_t rows, int64_t columns) {
     rowCapacity_ = static_cast<std::ptrdiff_t>(rows);
-    if (const ErrorCode failed = matrix_.allocate(rows * columns))
-        return failed;
-    if (const ErrorCode failed = vectors_.allocate(2 * columns))
-        return failed;
-    if (const ErrorCode failed = kappas_.allocate(columns))
-        return failed;
-    return diagonal_.allocate(columns);
+    return memory_.take(Sized(matrix_, rows * columns), Sized(vectors_, 2 * columns),
+                        Sized(kappas_, columns), Sized(diagonal_, columns));
 }
 
 void SylvesterMatrices::begin(const CDB *p, int32_t m, const CDB *q, int32_t n) {

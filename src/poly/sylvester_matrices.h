@@ -46,8 +46,9 @@ private:
     std::ptrdiff_t rowCapacity_ = 0;
     const CDB *p_ = nullptr, *q_ = nullptr;
     int32_t m_ = 0, n_ = 0, step_ = 0, columns_ = 0;
-    Scratch<ElementType::CDB> matrix_, vectors_, kappas_;
-    Scratch<ElementType::DBL> diagonal_;
+    ComplexVector matrix_, vectors_, kappas_;
+    RealVector diagonal_;
+    ScratchParts memory_;
 };
 
 } // namespace qx

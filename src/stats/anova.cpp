@@ -22,21 +22,20 @@ ErrorCode UpperTail(Distribution distribution, double *p) {
 
 } // namespace
 
-ErrorCode ContingencyTest(const I32 *table, int32_t rows, int32_t cols, DBL *chiSquare, DBL *p) {
-    if (rows < 0 || cols < 0)
-        return ErrTableNegativeSize;
+ErrorCode ContingencyTest(const ConstMatrixView<ElementType::I32> &table, DBL *chiSquare, DBL *p) {
+    const int32_t rows = table.rows(), cols = table.cols();
     if (rows < 2 || cols < 2)
         return ErrTableTooSmall;
-    Scratch<ElementType::DBL> sums;
-    if (const ErrorCode status = sums.allocate(int64_t{rows} + cols))
+    RealVector rowSum, colSum;
+    ScratchParts sums;
+    if (const ErrorCode status = sums.take(Sized(rowSum, rows), Sized(colSum, cols)))
         return status;
-    DBL *rowSum = sums.data();
-    DBL *colSum = sums.data() + rows;
-    Fill(rowSum, std::ptrdiff_t{rows} + cols, 0.0);
+    Fill(rowSum.data(), rows, 0.0);
+    Fill(colSum.data(), cols, 0.0);
     double total = 0.0;
     for (int32_t i = 0; i < rows; ++i)
         for (int32_t j = 0; j < cols; ++j) {
-            const int32_t cell = table[std::ptrdiff_t{i} * cols + j];
+            const int32_t cell = table(i, j);
             if (cell < 0)
                 return ErrTableNegativeSize;
             rowSum[i] += cell;
@@ -48,7 +47,7 @@ ErrorCode ContingencyTest(const I32 *table, int32_t rows, int32_t cols, DBL *chi
     for (int32_t i = 0; i < rows; ++i)
         for (int32_t j = 0; j < cols; ++j) {
             const double expected = colSum[j] * rowSum[i] / total;
-            const double difference = table[std::ptrdiff_t{i} * cols + j] - expected;
+            const double difference = table(i, j) - expected;
             statistic += difference * difference / expected;
         }
     *chiSquare = statistic;
@@ -62,8 +61,10 @@ ErrorCode ContingencyTest(const I32 *table, int32_t rows, int32_t cols, DBL *chi
     return Merge(status, sums.release());
 }
 
-ErrorCode OneWayAnova(const DBL *y, const I32 *labels, int32_t n, int32_t k, double alpha,
-                      OneWayTable *result) {
+ErrorCode OneWayAnova(ConstRealVector y, ConstVectorView<ElementType::I32> labels, int32_t k,
+                      double alpha, OneWayTable *result) {
+    QX_EXPECTS(labels.size() == y.size());
+    const auto n = static_cast<int32_t>(y.size());
     if (k < 2 || k >= n)
         return ErrAnovaFewLevels;
     if (alpha < 0.0 || alpha > 1.0)

@@ -1,4 +1,4 @@
-#include "frame/lanes.h"
+#include "frame/lane_masks.h"
 
 #include <gtest/gtest.h>
 
@@ -55,6 +55,75 @@ TYPED_TEST(LanesTest, MovesElementsAndNothingElse) {
     for (int i = 0; i < L::count; ++i)
         expected.data()[3 + 7 * i] = x.data()[L::count - 1 - i];
     EXPECT_EQ(0, std::memcmp(y.bytes + 4, expected.bytes + 4, 8 * 32));
+}
+
+template <class L>
+class LanePairsTest : public testing::Test {};
+typedef testing::Types<Lanes<2>, Lanes<4>> PairedLanes;
+TYPED_TEST_SUITE(LanePairsTest, PairedLanes);
+
+TYPED_TEST(LanePairsTest, TakeThePairsThatTheirNamesSay) {
+    typedef TypeParam L;
+    constexpr int n = L::count;
+    Offset x, y;
+    const L a = L::load(x.data()), b = L::load(x.data() + n);
+    const Lanes<2> first = Lanes<2>::load(x.data());
+    for (int i = 0; i < n; ++i) {
+        const int even = i / 2 * 2, odd = even + 1;
+        const double sign = i % 2 == 0 ? -1 : 1;
+        EXPECT_EQ(FirstsTwice(a)[i], a[even]);
+        EXPECT_EQ(SecondsTwice(a)[i], a[odd]);
+        EXPECT_EQ(Swapped(a)[i], a[i ^ 1]);
+        EXPECT_EQ(ReversedPairs(a)[i], a[n - 2 - even + i % 2]);
+        EXPECT_EQ(qx::InEveryPair<n>(first)[i], a[i % 2]);
+        EXPECT_EQ(NegatedInPairs(a, true)[i], sign * a[i]);
+        EXPECT_EQ(NegatedInPairs(a, false)[i], -sign * a[i]);
+        EXPECT_EQ(MinusPlus(a, b)[i], a[i] + sign * b[i]);
+        EXPECT_EQ(PairsLow(a, b)[i], (i % 2 == 0 ? a : b)[even]);
+        EXPECT_EQ(PairsHigh(a, b)[i], (i % 2 == 0 ? a : b)[odd]);
+    }
+    const DBL *const from[] = {x.data(), x.data() + 9, x.data() + 4, x.data() + 17};
+    DBL *const to[] = {y.data() + 1, y.data() + 20};
+    const L pairs = qx::LoadPairs<n>(from, 2), each = qx::LoadEach<n>(from, 3);
+    StorePairs(pairs, to, 5);
+    for (int i = 0; i < n; ++i) {
+        EXPECT_EQ(pairs[i], from[i / 2][2 + i % 2]);
+        EXPECT_EQ(to[i / 2][5 + i % 2], pairs[i]);
+        EXPECT_EQ(each[i], from[i][3]);
+    }
+}
+
+TYPED_TEST(LanePairsTest, CompareEachLaneAndNumberTheBitsFromLaneZero) {
+    typedef TypeParam L;
+    for (unsigned pattern = 0; pattern < 1U << L::count; ++pattern) {
+        L x(1.0);
+        for (int i = 0; i < L::count; ++i)
+            x.v[i] = (pattern >> i & 1) != 0 ? 2.0 : 1.0;
+        EXPECT_EQ(MaskBits(x > L(1.0)), pattern);
+        EXPECT_EQ(MaskBits(x >= L(2.0)), pattern);
+        EXPECT_EQ(MaskBits(L(1.0) < x), pattern);
+        EXPECT_EQ(Any(x > L(1.0)), pattern != 0);
+        x.v[0] = std::nan("");
+        EXPECT_EQ(MaskBits((x > L(1.0)) | (x <= L(1.0))) & 1, 0U);
+    }
+}
+
+template <class L>
+class FloatLanesTest : public testing::Test {};
+typedef testing::Types<qx::FloatLanes<1>, qx::FloatLanes<4>, qx::FloatLanes<8>> FloatCounts;
+TYPED_TEST_SUITE(FloatLanesTest, FloatCounts);
+
+TYPED_TEST(FloatLanesTest, DoInEachLaneWhatOneFloatWouldDo) {
+    typedef TypeParam L;
+    alignas(16) unsigned char bytes[4 + 4 * 24];
+    SGL *const x = reinterpret_cast<SGL *>(bytes + 4);
+    for (int i = 0; i < 24; ++i)
+        x[i] = 1.0F / static_cast<float>(i + 1);
+    (L::load(x) * L::load(x + 8) + L(0.1F)).store(x + 16);
+    for (int i = 0; i < L::count; ++i) {
+        const float product = x[i] * x[8 + i], expected = product + 0.1F, got = x[16 + i];
+        EXPECT_EQ(got, expected);
+    }
 }
 
 TEST(Widths, AreTheProcessorsUnlessTheEnvironmentForcesTheBaseline) {

@@ -12,8 +12,7 @@ namespace {
 ErrorCode Contingency(In<I32_2D> table, OutDBL chiSquare, OutDBL p) {
     if (table.hasNegativeSize())
         return ErrTableNegativeSize;
-    return ContingencyTest(table.data(), table.rows(), table.cols(), chiSquare.address(),
-                           p.address());
+    return ContingencyTest(table.view(), chiSquare.address(), p.address());
 }
 
 ErrorCode OneWay(In<DBL1D> y, In<I32_1D> labels, int32_t k, double alpha, OutDBL ssBetween,
@@ -23,7 +22,7 @@ ErrorCode OneWay(In<DBL1D> y, In<I32_1D> labels, int32_t k, double alpha, OutDBL
             {{y.size() != labels.size(), ErrSizeMismatch}, {y.isEmpty(), ErrEmptyInput}}))
         return failed;
     OneWayTable table = {};
-    const ErrorCode status = OneWayAnova(y.data(), labels.data(), y.size(), k, alpha, &table);
+    const ErrorCode status = OneWayAnova(y.view(), labels.view(), k, alpha, &table);
     ssBetween = table.ssBetween;
     msBetween = table.msBetween;
     f = table.f;
