@@ -1,5 +1,7 @@
 #include "linalg/matrix.h"
 
+#include "linalg/transpose.h"
+
 #include <algorithm>
 
 namespace qx {
@@ -8,10 +10,6 @@ namespace {
 
 // kept: the lower bound is a truncated constant, so the last numbers above -DBL_MAX are refused.
 bool IsRefused(double x) { return !(x < 0x1.fffffffffffffp1023 && x > -1.7976931348623e308); }
-
-// Rows that fit into the first cache together, so that neither side is read or written in long
-// strides.
-constexpr std::ptrdiff_t rowsAtOnce = 16;
 
 // Visits the packed elements in their order: at(i, j, packed element).
 template <class At>
@@ -44,16 +42,7 @@ void CopyMatrix(const ConstMatrixView<E> &from, const MatrixView<E> &to) {
 template <ElementType E>
 void CopyTransposed(const ConstMatrixView<E> &from, const MatrixView<E> &to) {
     QX_EXPECTS(to.rows() == from.cols() && to.cols() == from.rows());
-    const std::ptrdiff_t rows = from.rows(), cols = from.cols();
-    const std::ptrdiff_t fromStride = from.stride(), toStride = to.stride();
-    const ElementOf<E> *const x = from.data();
-    ElementOf<E> *const y = to.data();
-    for (std::ptrdiff_t top = 0; top < rows; top += rowsAtOnce) {
-        const std::ptrdiff_t bottom = std::min(top + rowsAtOnce, rows);
-        for (std::ptrdiff_t j = 0; j < cols; ++j)
-            for (std::ptrdiff_t i = top; i < bottom; ++i)
-                y[j * toStride + i] = x[i * fromStride + j];
-    }
+    Transpose<E>(from.data(), from.stride(), from.rows(), from.cols(), to.data(), to.stride());
 }
 
 template <ElementType E>

@@ -2,6 +2,7 @@
 
 #include "linalg/exports/checks.h"
 #include "linalg/properties/special.h"
+#include "linalg/transpose.h"
 
 namespace qx {
 namespace {
@@ -121,7 +122,7 @@ Outcome Transposed(In<Matrix> a, Out<Matrix> out) {
         return ErrEmptyInput;
     if (const Outcome bad = out.resize(a.cols(), a.rows()))
         return bad;
-    CopyTransposed<elementOf<Matrix>>(a.view(), out.view());
+    Transpose<elementOf<Matrix>>(a.data(), a.cols(), a.rows(), a.cols(), out.data(), a.rows());
     return 0;
 }
 
