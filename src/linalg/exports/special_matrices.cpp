@@ -122,7 +122,8 @@ Outcome Transposed(In<Matrix> a, Out<Matrix> out) {
         return ErrEmptyInput;
     if (const Outcome bad = out.resize(a.cols(), a.rows()))
         return bad;
-    Transpose<elementOf<Matrix>>(a.data(), a.cols(), a.rows(), a.cols(), out.data(), a.rows());
+    const std::ptrdiff_t rows = a.rows(), cols = a.cols();
+    Transpose<elementOf<Matrix>>(a.data(), cols, rows, cols, out.data(), rows);
     return 0;
 }
 

@@ -63,27 +63,27 @@ ErrorCode DeterminantByCholesky(const ConstMatrixView<E> &a, ElementOf<E> *det) 
 // The largest sum of moduli of a row, or of a column.
 template <ElementType E>
 double LargestRowSum(const ConstMatrixView<E> &a) {
-    const std::ptrdiff_t rows = a.rows(), cols = a.cols(), stride = a.stride();
-    const ElementOf<E> *const elements = a.data();
+    const std::ptrdiff_t rows = a.rows(), cols = a.cols();
+    const ConstVectorView<E> elements = a.elements();
     double largest = 0.0;
     for (std::ptrdiff_t i = 0; i < rows; ++i) {
         double sum = 0.0;
         for (std::ptrdiff_t j = 0; j < cols; ++j)
-            sum += Modulus(elements[i * stride + j]);
-        largest = std::max(largest, sum);
+            sum += Modulus(elements[i * cols + j]);
+        largest = sum > largest ? sum : largest;
     }
     return largest;
 }
 template <ElementType E>
 double LargestColumnSum(const ConstMatrixView<E> &a) {
-    const std::ptrdiff_t rows = a.rows(), cols = a.cols(), stride = a.stride();
-    const ElementOf<E> *const elements = a.data();
+    const std::ptrdiff_t rows = a.rows(), cols = a.cols();
+    const ConstVectorView<E> elements = a.elements();
     double largest = 0.0;
     for (std::ptrdiff_t j = 0; j < cols; ++j) {
         double sum = 0.0;
         for (std::ptrdiff_t i = 0; i < rows; ++i)
-            sum += Modulus(elements[i * stride + j]);
-        largest = std::max(largest, sum);
+            sum += Modulus(elements[i * cols + j]);
+        largest = sum > largest ? sum : largest;
     }
     return largest;
 }
