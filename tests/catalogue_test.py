@@ -161,7 +161,7 @@ class NaN(unittest.TestCase):
         text = """/** As x is NaN: 0.
     NaN: x, in.level refused with ErrEmptyInput or
     in no result; in in some results. More. */ QX_API void first(double x, double in);
-/** As first, elsewhere. */ QX_API void second(double in, double y);
+/** As first, elsewhere. */ QX_API void second(double in, double y, int32_t x);
 /** As first. NaN: y in all results. */ QX_API void third(double y);
 /** Not above 0 or NaN: 1e-10. */ QX_API void fourth(double y);
 """

@@ -495,6 +495,7 @@ def resolve(export, by_name, path=()):
             raise ValueError(f"says of {place} what a NaN does there, which is no argument")
     if own is None:
         inherited = like["nan"] if like else {}
+        names -= {a["name"] for a in export["arguments"] if a.get("element") in WHOLE}
         export["nan"] = {p: words for p, words in inherited.items() if p.split(".")[0] in names}
 
 
