@@ -50,3 +50,12 @@ noise = np.random.default_rng(1).normal(size=1000)
 y4, _ = qx.IIR_Filter2(noise, 1, a4, b4, [], 0)
 y2, _ = qx.IIR_Filter2(noise, 0, a2, b2, [], 0)
 print(len(a4) // 4, "and", len(a2) // 2, "sections, equal within 1e-10:", np.allclose(y4, y2, atol=1e-10))
+
+# %%
+# A narrow bandpass by poles and zeros
+# ------------------------------------
+
+a, b, zeros, poles, factor = qx.BWCoefs2026(1000.0, 1.0, 1.01, 6, 2)
+print(len(a) // 2, "sections; the greatest pole has modulus", abs(poles).max().round(9))
+z0 = np.exp(2j * np.pi * 1.005 / 1000)
+print("gain in the middle:", abs(factor * np.prod(z0 - zeros) / np.prod(z0 - poles)).round(6))

@@ -781,6 +781,26 @@ def BesselCoefs90(fs: float, fl: float, fh: float, order: int, type: int, form: 
     """As BesselCoefs, with a choice of the form. Bessel filter, whose group delay is maximally flat at ..."""
 
 
+def BWCoefs2026(fs: float, fl: float, fh: float, order: int, type: int) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.complex128], NDArray[np.complex128], float]:
+    """Butterworth filter by its poles and zeros: the definition is that of BWCoefs."""
+
+
+def ChebyshevCoefs2026(fs: float, fl: float, fh: float, ripple: float, order: int, type: int) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.complex128], NDArray[np.complex128], float]:
+    """Chebyshev filter as of ChebyshevCoefs, with outputs as of BWCoefs2026."""
+
+
+def InvChebyshevCoefs2026(fs: float, fl: float, fh: float, attenuation: float, order: int, type: int) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.complex128], NDArray[np.complex128], float]:
+    """Inverse Chebyshev filter as of InvChebyshevCoefs, with outputs as of BWCoefs2026."""
+
+
+def EllipticCoefs2026(fs: float, fl: float, fh: float, ripple: float, attenuation: float, order: int, type: int) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.complex128], NDArray[np.complex128], float]:
+    """Elliptic filter as of EllipticCoefs, with outputs as of BWCoefs2026: by theta functions of the ..."""
+
+
+def BesselCoefs2026(fs: float, fl: float, fh: float, order: int, type: int) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.complex128], NDArray[np.complex128], float]:
+    """Bessel filter as of BesselCoefs, with outputs as of BWCoefs2026."""
+
+
 def PolyInterp_head(y: ArrayLike, x: ArrayLike, xi: float) -> tuple[float, float]:
     """The polynomial through the points (x, y) at *xi, by Neville's tableau."""
 

@@ -90,6 +90,7 @@ class Filter:
     """
 
     ripple: float  # of an equiripple filter
+    _designed: tuple[NDArray[Any], NDArray[Any]] | None = None  # zeros and poles, where a design gives them
 
     def __init__(self, b: Any, a: Any, is_cascade: Any, fs: Any = 1.0, title: Any = "",
                  main: Any = None) -> None:
@@ -300,18 +301,19 @@ class Filter:
 
     @property
     def poles(self) -> NDArray[np.complex128]:
-        """The poles in the z plane; a filter without feedback has them all at 0."""
-        return self._roots(1)
+        """The poles in the z plane; a filter without feedback has them all at 0. Of an IIR design those
+        that its coefficients are rounded from."""
+        return self._designed[1] if self._designed else self._roots(1)
 
     @property
     def zeros(self) -> NDArray[np.complex128]:
-        """The zeros in the z plane."""
-        return self._roots(0)
+        """The zeros in the z plane; of an IIR design those that its coefficients are rounded from."""
+        return self._designed[0] if self._designed else self._roots(0)
 
     @property
     def is_stable(self) -> bool:
-        """Whether all poles are inside the unit circle."""
-        return bool(np.all(np.abs(self.poles) < 1))
+        """Whether all poles of the coefficients as they are stored are inside the unit circle."""
+        return bool(np.all(np.abs(self._roots(1)) < 1))
 
     @property
     def delay(self) -> float:
@@ -519,10 +521,12 @@ def _iir(name: Any, order: Any, levels: Any, cutoff: Any, kind: Any, fs: Any) ->
                    "ErrRippleNotPositive" if argument == "ripple" else "ErrAttenuationNotPositive")
     if len(levels) == 2 and not levels["ripple"] < levels["attenuation"]:
         refuse(function, "ripple", "must be below the attenuation", "ErrRippleAboveAttenuation")
-    a, b = getattr(core, name)(fs, fl, fh, *levels.values(), order, code, 0)
+    a, b, zeros, poles, _ = getattr(core, name)(fs, fl, fh, *levels.values(), order, code)
     shown = f"{fl:g}" if code < 2 else f"{fl:g} to {fh:g}"
-    return Filter(b, a, True, fs, f"{name} {kind} of order {order}, cutoff {shown}, fs {fs:g}",
-                  _main(code, fl, fh, fs))
+    found = Filter(b, a, True, fs, f"{name} {kind} of order {order}, cutoff {shown}, fs {fs:g}",
+                   _main(code, fl, fh, fs))
+    found._designed = zeros, poles
+    return found
 
 
 def butterworth(order: int, cutoff: float | tuple[float, float],
@@ -694,7 +698,7 @@ def bessel(order: int, cutoff: float | tuple[float, float],
     Parameters
     ----------
     order : int
-        The order n of the prototype, up to 150.
+        The order n of the prototype, up to 500.
     cutoff : float or (float, float)
         The edge, or the two edges of a band, in the unit of fs.
     kind : {"lowpass", "highpass", "bandpass", "bandstop"}

@@ -20,8 +20,8 @@ TOPICS = ("filters", "fft", "windows", "spectra", "signals", "noise", "multirate
 NEWEST = {
     "filters": {
         "narrow": "FIRNarrowCoef_head", "narrow_filter": "FIRnarrowFilter_head",
-        "butterworth": "BWCoefs90", "chebyshev1": "ChebyshevCoefs90",
-        "chebyshev2": "InvChebyshevCoefs90", "elliptic": "EllipticCoefs90", "bessel": "BesselCoefs90",
+        "butterworth": "BWCoefs2026", "chebyshev1": "ChebyshevCoefs2026", "chebyshev2":
+        "InvChebyshevCoefs2026", "elliptic": "EllipticCoefs2026", "bessel": "BesselCoefs2026",
         "windowed": "FIRCoefs", "windowed_window": "AllWinH", "equiripple": "Parks",
         "Filter_cascade": "IIR_Filter2", "Filter_cascade_complex": "CxSigIIR_Filter2",
         "Filter_direct": "IIR_Filter", "Filter_direct_complex": "CxSigIIR_Filter",

@@ -1,7 +1,10 @@
 #include "filters/iir_design.h"
 
+#include "filters/pole_zero_prototypes.h"
 #include "frame/export.h"
 #include "qx/iir_design.h"
+
+#include <cmath>
 
 namespace qx {
 namespace {
@@ -105,12 +108,123 @@ Outcome Elliptic(Arguments arguments, double ripple, double attenuation, int32_t
     return DesignInto(arguments, form, check, design, a, b);
 }
 
+// The outputs of the designs by poles and zeros.
+struct Places {
+    Out<DBL1D> &a, &b;
+    Out<CDB1D> &zeros, &poles;
+    OutDBL &gain;
+};
+
+ErrorCode CheckDesign(const FilterBand &band, int32_t order, int32_t type) {
+    constexpr int32_t highestOrder = 500;
+    const auto &[fs, fl, fh] = band;
+    const bool isBand = type == Bandpass || type == Bandstop;
+    const bool hasRate = fs > 0.0 && std::isfinite(fs);
+    const bool hasEdges = isBand ? fl > 0.0 && fh > fl : fl > 0.0;
+    return FirstFailed({{order < 1, ErrOrderNotPositive},
+                        {order > highestOrder, ErrLengthTooLarge},
+                        {type < Lowpass || type > Bandstop, ErrInvalidSelector},
+                        {!hasRate || !hasEdges, ErrBadCutoff},
+                        {!((isBand ? fh : fl) < fs * 0.5), ErrAboveNyquist}});
+}
+
+// `fill` takes the sections.
+template <class Fill>
+Outcome DesignByPoles(const FilterBand &band, int32_t order, int32_t type, double gainAt0,
+                      const Fill &fill, const Places &places) {
+    const int32_t sections = SectionsOf(type, order), poles = PolesOf(type, order);
+    if (const Outcome bad = places.a.resize(2 * sections))
+        return bad;
+    if (const Outcome bad = places.b.resize(3 * sections))
+        return bad;
+    if (const Outcome bad = places.zeros.resize(poles))
+        return bad;
+    if (const Outcome bad = places.poles.resize(poles))
+        return bad;
+    PoleZeroSections filled(
+        type, band, gainAt0,
+        {places.a.view(), places.b.view(), places.zeros.view(), places.poles.view()});
+    if (const ErrorCode failed = fill(filled))
+        return failed;
+    for (const DBL &value : places.b.view())
+        if (!std::isfinite(value))
+            return ErrDegenerateValue;
+    places.gain = filled.gain();
+    return std::isfinite(filled.gain()) ? 0 : ErrDegenerateValue;
+}
+
+Outcome ButterworthByPoles(FilterBand band, int32_t order, int32_t type, Out<DBL1D> a, Out<DBL1D> b,
+                           Out<CDB1D> zeros, Out<CDB1D> poles, OutDBL gain) {
+    if (const ErrorCode bad = CheckDesign(band, order, type))
+        return bad;
+    const auto fill = [=](PoleZeroSections &sections) -> ErrorCode {
+        ButterworthPoles(order, sections);
+        return 0;
+    };
+    return DesignByPoles(band, order, type, 1.0, fill, {a, b, zeros, poles, gain});
+}
+
+Outcome BesselByPoles(FilterBand band, int32_t order, int32_t type, Out<DBL1D> a, Out<DBL1D> b,
+                      Out<CDB1D> zeros, Out<CDB1D> poles, OutDBL gain) {
+    if (const ErrorCode bad = CheckDesign(band, order, type))
+        return bad;
+    const auto fill = [=](PoleZeroSections &sections) { return BesselPoles(order, sections); };
+    return DesignByPoles(band, order, type, 1.0, fill, {a, b, zeros, poles, gain});
+}
+
+Outcome ChebyshevByPoles(FilterBand band, double ripple, int32_t order, int32_t type, Out<DBL1D> a,
+                         Out<DBL1D> b, Out<CDB1D> zeros, Out<CDB1D> poles, OutDBL gain) {
+    if (const ErrorCode bad = CheckDesign(band, order, type))
+        return bad;
+    if (!(ripple > 0.0))
+        return ErrRippleNotPositive;
+    const auto fill = [=](PoleZeroSections &sections) -> ErrorCode {
+        ChebyshevPoles(order, ripple, sections);
+        return 0;
+    };
+    return DesignByPoles(band, order, type, GainAt0(order, ripple), fill,
+                         {a, b, zeros, poles, gain});
+}
+
+Outcome InvChebyshevByPoles(FilterBand band, double attenuation, int32_t order, int32_t type,
+                            Out<DBL1D> a, Out<DBL1D> b, Out<CDB1D> zeros, Out<CDB1D> poles,
+                            OutDBL gain) {
+    if (const ErrorCode bad = CheckDesign(band, order, type))
+        return bad;
+    if (!(attenuation > 0.0))
+        return ErrAttenuationNotPositive;
+    const auto fill = [=](PoleZeroSections &sections) -> ErrorCode {
+        InvChebyshevPoles(order, attenuation, sections);
+        return 0;
+    };
+    return DesignByPoles(band, order, type, 1.0, fill, {a, b, zeros, poles, gain});
+}
+
+Outcome EllipticByPoles(FilterBand band, double ripple, double attenuation, int32_t order,
+                        int32_t type, Out<DBL1D> a, Out<DBL1D> b, Out<CDB1D> zeros,
+                        Out<CDB1D> poles, OutDBL gain) {
+    if (const ErrorCode bad = CheckDesign(band, order, type))
+        return bad;
+    if (const ErrorCode bad = FirstFailed({{!(ripple > 0.0), ErrRippleNotPositive},
+                                           {!(attenuation > 0.0), ErrAttenuationNotPositive},
+                                           {ripple >= attenuation, ErrRippleAboveAttenuation}}))
+        return bad;
+    const auto fill = [=](PoleZeroSections &sections) -> ErrorCode {
+        EllipticPoles(order, ripple, attenuation, sections);
+        return 0;
+    };
+    return DesignByPoles(band, order, type, GainAt0(order, ripple), fill,
+                         {a, b, zeros, poles, gain});
+}
+
 } // namespace
 } // namespace qx
 
 using qx::Arguments;
+using qx::FilterBand;
 using qx::InErrWithHost;
 using qx::NativeForm;
+using qx::Returned;
 
 int32_t BWCoefs(const double *fs, const double *fl, const double *fh, const int32_t *order,
                 const int32_t *type, DBL1D a, DBL1D b, ErrorCode *err) {
@@ -174,4 +288,37 @@ int32_t EllipticCoefs90(const double *fs, const double *fl, const double *fh, co
                         int32_t form, DBL1D a, DBL1D b, ErrorCode *err) {
     return InErrWithHost(err, qx::Elliptic, Arguments(fs, fl, fh, order, type), *ripple,
                          *attenuation, form, a, b);
+}
+
+ErrorCode BWCoefs2026(double fs, double fl, double fh, int32_t order, int32_t type, DBL1D a,
+                      DBL1D b, CDB1D zeros, CDB1D poles, double *gain) {
+    return Returned(qx::ButterworthByPoles, FilterBand{fs, fl, fh}, order, type, a, b, zeros, poles,
+                    gain);
+}
+
+ErrorCode ChebyshevCoefs2026(double fs, double fl, double fh, double ripple, int32_t order,
+                             int32_t type, DBL1D a, DBL1D b, CDB1D zeros, CDB1D poles,
+                             double *gain) {
+    return Returned(qx::ChebyshevByPoles, FilterBand{fs, fl, fh}, ripple, order, type, a, b, zeros,
+                    poles, gain);
+}
+
+ErrorCode InvChebyshevCoefs2026(double fs, double fl, double fh, double attenuation, int32_t order,
+                                int32_t type, DBL1D a, DBL1D b, CDB1D zeros, CDB1D poles,
+                                double *gain) {
+    return Returned(qx::InvChebyshevByPoles, FilterBand{fs, fl, fh}, attenuation, order, type, a, b,
+                    zeros, poles, gain);
+}
+
+ErrorCode EllipticCoefs2026(double fs, double fl, double fh, double ripple, double attenuation,
+                            int32_t order, int32_t type, DBL1D a, DBL1D b, CDB1D zeros, CDB1D poles,
+                            double *gain) {
+    return Returned(qx::EllipticByPoles, FilterBand{fs, fl, fh}, ripple, attenuation, order, type,
+                    a, b, zeros, poles, gain);
+}
+
+ErrorCode BesselCoefs2026(double fs, double fl, double fh, int32_t order, int32_t type, DBL1D a,
+                          DBL1D b, CDB1D zeros, CDB1D poles, double *gain) {
+    return Returned(qx::BesselByPoles, FilterBand{fs, fl, fh}, order, type, a, b, zeros, poles,
+                    gain);
 }

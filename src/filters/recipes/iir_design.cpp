@@ -8,7 +8,7 @@ namespace qx::test {
 
 namespace {
 
-constexpr auto DBL = ElementType::DBL;
+constexpr auto DBL = ElementType::DBL, CDB = ElementType::CDB;
 
 // What the exports have in common: order, type and form of a variant, and edges of a rate of 1000.
 struct Design {
@@ -29,9 +29,16 @@ struct Design {
     }
 };
 
+template <class Export, class... Levels>
+int32_t ByPoles(Call &c, Design d, Export export_, Levels... levels) {
+    return export_(1000.0, 80.0, 210.0, levels..., d.order, d.type, c.out<DBL>(0), c.out<DBL>(1),
+                   c.out<CDB>(2), c.out<CDB>(3), c.scalar(0));
+}
+
 std::vector<Recipe> IIRDesignRecipes() {
     std::vector<Recipe> recipes;
-    const auto add = [&](const std::string &name, int32_t forms, auto run) {
+    const auto add = [&](const std::string &name, int32_t forms, auto run,
+                         unsigned quirks = HostStatusInResult) {
         for (int32_t type = 0; type < 4; ++type)
             for (int32_t form = 0; form < forms; ++form)
                 for (const int32_t order : {4, 7}) {
@@ -42,7 +49,7 @@ std::vector<Recipe> IIRDesignRecipes() {
                                        [=](Call &c) {
                                            return run(c, Design{order, type, form});
                                        },
-                                       HostStatusInResult,
+                                       quirks,
                                        {1}});
                 }
     };
@@ -62,6 +69,21 @@ std::vector<Recipe> IIRDesignRecipes() {
         [](Call &c, Design d) { return d.plain(c, EllipticCoefs, ripple, attenuation); });
     add("EllipticCoefs90", 2,
         [](Call &c, Design d) { return d.formed(c, EllipticCoefs90, ripple, attenuation); });
+    add(
+        "BWCoefs2026", 1, [](Call &c, Design d) { return ByPoles(c, d, BWCoefs2026); }, None);
+    add(
+        "BesselCoefs2026", 1, [](Call &c, Design d) { return ByPoles(c, d, BesselCoefs2026); },
+        None);
+    add(
+        "ChebyshevCoefs2026", 1,
+        [](Call &c, Design d) { return ByPoles(c, d, ChebyshevCoefs2026, ripple); }, None);
+    add(
+        "InvChebyshevCoefs2026", 1,
+        [](Call &c, Design d) { return ByPoles(c, d, InvChebyshevCoefs2026, attenuation); }, None);
+    add(
+        "EllipticCoefs2026", 1,
+        [](Call &c, Design d) { return ByPoles(c, d, EllipticCoefs2026, ripple, attenuation); },
+        None);
     return recipes;
 }
 

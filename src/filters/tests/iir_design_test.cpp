@@ -17,6 +17,7 @@
 
 namespace {
 
+using qx::test::CDBArray;
 using qx::test::DBLArray;
 using qx::test::ReadTable;
 using qx::test::ResetHost;
@@ -378,6 +379,203 @@ TEST(IIRDesign, TellsWhatCannotBeInOrder) {
             EXPECT_EQ(lost.err, 0);
             EXPECT_TRUE(std::isnan(lost.a[0]) && std::isnan(lost.b[0]));
         }
+}
+
+struct PoleZeroCascade : Cascade {
+    std::vector<std::complex<double>> zeros, poles;
+    double factor = 7.0; // of the products over zeros and poles
+};
+
+std::vector<std::complex<double>> Numbers(const CDBArray &array) {
+    std::vector<std::complex<double>> numbers;
+    for (const auto &value : array.values())
+        numbers.emplace_back(value.re, value.im);
+    return numbers;
+}
+
+PoleZeroCascade DesignedByPoles(const Design &d) {
+    const DBLArray a(std::vector<double>(3, 7.0)), b(std::vector<double>(3, 7.0));
+    const CDBArray zeros(0), poles(0);
+    PoleZeroCascade made;
+    const DBL1D A = a.handle(), B = b.handle();
+    const CDB1D Z = zeros.handle(), P = poles.handle();
+    double *const k = &made.factor;
+    const double fs = d.fs, fl = d.fl, fh = d.fh, rp = d.ripple, rs = d.attenuation;
+    switch (d.family) {
+    case BW:
+        made.err = BWCoefs2026(fs, fl, fh, d.order, d.type, A, B, Z, P, k);
+        break;
+    case Chebyshev:
+        made.err = ChebyshevCoefs2026(fs, fl, fh, rp, d.order, d.type, A, B, Z, P, k);
+        break;
+    case InvChebyshev:
+        made.err = InvChebyshevCoefs2026(fs, fl, fh, rs, d.order, d.type, A, B, Z, P, k);
+        break;
+    case Elliptic:
+        made.err = EllipticCoefs2026(fs, fl, fh, rp, rs, d.order, d.type, A, B, Z, P, k);
+        break;
+    default:
+        made.err = BesselCoefs2026(fs, fl, fh, d.order, d.type, A, B, Z, P, k);
+    }
+    made.a = a.values();
+    made.b = b.values();
+    made.zeros = Numbers(zeros);
+    made.poles = Numbers(poles);
+    return made;
+}
+
+double FromNearest(const std::vector<std::complex<double>> &found, std::complex<double> exact) {
+    double least = 10;
+    for (const std::complex<double> one : found)
+        least = std::min(least, std::abs(one - exact));
+    return least;
+}
+
+// Narrow bands at 1e-4 of the rate, wide ones, and edges next to half of it, to order 30.
+TEST(IIRDesign2026, HasPolesZerosAndGainOfFiftyDigits) {
+    ResetHost();
+    constexpr double pole = 0, factor = 2; // what a row has; the others are zeros
+    std::string last;
+    PoleZeroCascade made;
+    for (const TableRow &row : ReadTable(TestData("pole_zero_designs.dat"))) {
+        const auto &v = row.arguments;
+        const std::string design = row.text.substr(0, row.text.find(" 70.0 "));
+        if (design != last)
+            made = DesignedByPoles({FamilyOf(row.name), static_cast<int32_t>(v[0]),
+                                    static_cast<int32_t>(v[1]), v[2], v[3], v[4], v[5]});
+        last = design;
+        ASSERT_EQ(made.err, 0) << design;
+        if (v[6] == factor)
+            EXPECT_NEAR(made.factor / v[7], 1.0, 6e-14) << row.text;
+        else
+            EXPECT_LT(FromNearest(v[6] == pole ? made.poles : made.zeros, {v[7], row.value}), 1e-14)
+                << row.text;
+    }
+}
+
+// The sections are the poles and zeros in their order, the gain is in their leading coefficients,
+// and the product is the filter that its elder makes.
+TEST(IIRDesign2026, MakesSectionsOfItsPolesAndZeros) {
+    ResetHost();
+    for (int family = BW; family <= Bessel; ++family)
+        for (int32_t type = Lowpass; type <= Bandstop; ++type)
+            for (const int32_t order : {1, 2, 5, 8}) {
+                const Design design = {family, order, type, 0.07, 0.31};
+                const PoleZeroCascade made = DesignedByPoles(design);
+                const std::size_t degree =
+                    static_cast<std::size_t>(type >= Bandpass ? 2 * order : order);
+                ASSERT_EQ(made.poles.size(), degree);
+                ASSERT_EQ(made.zeros.size(), degree);
+                ASSERT_EQ(made.b.size(), (degree + 1) / 2 * 3);
+                double product = 1;
+                std::size_t at = 0;
+                for (std::size_t s = 0; s < made.sections(); ++s) {
+                    const bool isFirstOrder = degree % 2 != 0 && s == 0;
+                    const auto partner = [&](const auto &roots) {
+                        return isFirstOrder ? 0.0 : roots[at + 1];
+                    };
+                    const auto p = made.poles[at], q = partner(made.poles);
+                    const auto y = made.zeros[at], z = partner(made.zeros);
+                    at += isFirstOrder ? 1 : 2;
+                    const double lead = made.b[3 * s];
+                    product *= lead;
+                    EXPECT_LT(std::abs(made.a[2 * s] + p + q), 1e-15);
+                    EXPECT_LT(std::abs(made.a[2 * s + 1] - p * q), 1e-15);
+                    EXPECT_LT(std::abs(made.b[3 * s + 1] + lead * (y + z)), 1e-15 * lead);
+                    EXPECT_LT(std::abs(made.b[3 * s + 2] - lead * (y * z)), 1e-15 * lead);
+                }
+                EXPECT_NEAR(product / made.factor, 1.0, 1e-14);
+                const Cascade elder = Designed(design);
+                for (const double f : {0.0, 0.03, 0.07, 0.15, 0.31, 0.4, 0.5})
+                    EXPECT_LT(std::abs(made.at(f) - elder.at(f)), 1e-11)
+                        << family << " " << type << " " << order << " " << f;
+            }
+}
+
+TEST(IIRDesign2026, OrdersItsSectionsAndKeepsThemAt1InTheMiddle) {
+    ResetHost();
+    for (int family = BW; family <= Bessel; ++family)
+        for (int32_t type = Lowpass; type <= Bandstop; ++type) {
+            const PoleZeroCascade made = DesignedByPoles({family, 9, type, 0.1, 0.12});
+            ASSERT_EQ(made.err, 0);
+            const double center = std::atan(std::sqrt(std::tan(0.1 * static_cast<double>(pi)) *
+                                                      std::tan(0.12 * static_cast<double>(pi)))) /
+                                  static_cast<double>(pi);
+            const double middle[] = {0.0, 0.5, center, 0.0};
+            for (std::size_t s = 0; s < made.sections(); ++s)
+                EXPECT_NEAR(std::abs(made.section(s, middle[type])), 1.0, 1e-12) << family << type;
+            double least = 2; // the damping of a pole, -Re S / |S|
+            for (const std::complex<double> z : made.poles) {
+                const std::complex<double> S = (z - 1.0) / (z + 1.0);
+                EXPECT_LT(-S.real() / std::abs(S), least + 1e-12) << family << type;
+                least = -S.real() / std::abs(S);
+            }
+        }
+}
+
+// What the elders lose: Bessel poles one by one at high orders, ripples below the rounding of 1,
+// narrow bands.
+TEST(IIRDesign2026, DesignsWhereItsEldersLoseDigits) {
+    ResetHost();
+    for (const int32_t order : {40, 151, 500}) {
+        const PoleZeroCascade bessel = DesignedByPoles({Bessel, order, Lowpass, 0.1});
+        EXPECT_NEAR(bessel.decibels(0.1), 10 * std::log10(0.5), 1e-9);
+        std::size_t reals = 0;
+        for (const auto &pole : bessel.poles) {
+            EXPECT_LT(std::abs(pole), 1.0);
+            reals += pole.imag() == 0 ? 1 : 0;
+        }
+        EXPECT_EQ(reals, static_cast<std::size_t>(order % 2));
+    }
+    const double tiny = 1e-17;
+    const PoleZeroCascade flat = DesignedByPoles({Chebyshev, 2, Lowpass, 0.1, 0.2, tiny});
+    // Of order 2 and a small ripple, |H|^2 = 1 / (1 + e^2 (2 w^2 - 1)^2).
+    const double excess = std::expm1(tiny * std::log(10.0) / 10);
+    const double w =
+        std::tan(0.4 * static_cast<double>(pi)) / std::tan(0.1 * static_cast<double>(pi));
+    const double T = 2 * w * w - 1;
+    EXPECT_NEAR(flat.gain(0.4), 1 / std::sqrt(1 + excess * T * T), 1e-14);
+    for (const int32_t type : {Bandpass, Bandstop}) {
+        const Design narrow = {BW, 8, type, 1e-3, 1.001e-3};
+        const double f = 1.0002e-3;
+        EXPECT_NEAR(DesignedByPoles(narrow).gain(f), ClosedFormGain(narrow, f), 1e-6);
+    }
+}
+
+TEST(IIRDesign2026, RefusesWhatNoFilterHas) {
+    ResetHost();
+    struct Case {
+        Design design;
+        ErrorCode code;
+    };
+    std::vector<Case> cases;
+    for (int family = BW; family <= Bessel; ++family)
+        cases.insert(cases.end(),
+                     {{{family, 0, 7, nan}, ErrOrderNotPositive},
+                      {{family, 501, 7, nan}, ErrLengthTooLarge},
+                      {{family, 3, 4, nan}, ErrInvalidSelector},
+                      {{family, 3, Lowpass, nan}, ErrBadCutoff},
+                      {{family, 3, Lowpass, 0.1, 0.2, 1, 60, nan}, ErrBadCutoff},
+                      {{family, 3, Bandpass, 0.3, 0.3}, ErrBadCutoff},
+                      {{family, 3, Bandpass, 0.3, nan}, ErrBadCutoff},
+                      {{family, 3, Highpass, 0.5, 0.2, nan, nan}, ErrAboveNyquist},
+                      {{family, 3, Bandstop, 0.1, 0.5}, ErrAboveNyquist},
+                      {{family, 6, Bandpass, 1e-320, 2e-320, 1, 60, 1e3}, ErrDegenerateValue}});
+    for (const double level : {0.0, nan}) {
+        cases.push_back({{Chebyshev, 3, Lowpass, 0.1, 0.2, level}, ErrRippleNotPositive});
+        cases.push_back({{InvChebyshev, 3, 0, 0.1, 0.2, 1, level}, ErrAttenuationNotPositive});
+        cases.push_back({{Elliptic, 3, Lowpass, 0.1, 0.2, level, level}, ErrRippleNotPositive});
+        cases.push_back({{Elliptic, 3, Lowpass, 0.1, 0.2, 1, level}, ErrAttenuationNotPositive});
+    }
+    cases.push_back({{Elliptic, 3, Lowpass, 0.1, 0.2, 3, 3}, ErrRippleAboveAttenuation});
+    cases.push_back({{Chebyshev, 3, Lowpass, 0.1, 0.2, 5e-324}, ErrDegenerateValue});
+    cases.push_back({{InvChebyshev, 3, Lowpass, 0.1, 0.2, 1, 4000}, ErrDegenerateValue});
+    cases.push_back({{Elliptic, 3, Lowpass, 0.1, 0.2, 1, 4000}, ErrDegenerateValue});
+    for (const auto &[design, code] : cases) {
+        const PoleZeroCascade made = DesignedByPoles(design);
+        EXPECT_EQ(made.err, code) << design.family << " " << design.order << " " << design.type;
+        EXPECT_TRUE(made.a.empty() && made.poles.empty() && std::isnan(made.factor));
+    }
 }
 
 } // namespace
