@@ -29,6 +29,24 @@ def noise_cases(n):
     ]
 
 
+def counter_cases(n):
+    random = np.random.default_rng(1)
+    place = (1, 0, 0.0)
+    return [
+        ("uniform", lambda: qx.White2026(n, 1.0, *place), lambda: random.random(n)),
+        ("Gauss", lambda: qx.Gauss2026(n, 1.0, *place), lambda: random.standard_normal(n)),
+        ("gamma, shape 2.5", lambda: qx.Gamma2026(n, 2.5, *place), lambda: random.standard_gamma(2.5, n)),
+        ("gamma, shape 0.3", lambda: qx.Gamma2026(n, 0.3, *place), lambda: random.standard_gamma(0.3, n)),
+        ("Poisson, mean 5", lambda: qx.Poisson2026(n, 5.0, *place), lambda: random.poisson(5.0, n)),
+        ("Poisson, mean 1e4", lambda: qx.Poisson2026(n, 1e4, *place), lambda: random.poisson(1e4, n)),
+        ("binomial, 20 trials", lambda: qx.Binomial2026(n, 20.0, 0.3, *place),
+         lambda: random.binomial(20, 0.3, n)),
+        ("binomial, 1000 trials", lambda: qx.Binomial2026(n, 1000.0, 0.4, *place),
+         lambda: random.binomial(1000, 0.4, n)),
+        ("permutation", lambda: qx.RiffleIntNum2026_head(n, *place), lambda: random.permutation(n)),
+    ]
+
+
 def wave_cases(n):
     i = np.arange(n)
     table = np.sin(np.arange(1000) * 2 * np.pi / 1000)
@@ -94,7 +112,8 @@ def coordinate_cases(n):
     ]
 
 
-GROUPS = [("noise, called from Python", noise_cases), ("waves, called from Python", wave_cases),
+GROUPS = [("noise, called from Python", noise_cases),
+          ("noise of 2026, called from Python", counter_cases), ("waves, called from Python", wave_cases),
           ("scaling and unwrapping, called from Python", array_cases),
           ("coordinates, called from Python", coordinate_cases)]
 

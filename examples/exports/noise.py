@@ -46,3 +46,14 @@ for name, x in noises.items():
 
 x, state = qx.PeriodNoise(64, 1.0, seed, state)
 print(np.round(np.abs(np.fft.rfft(x)) / 32, 12))
+
+# %%
+# Noise of 2026: any place at once, and streams of one key
+# --------------------------------------------------------
+
+key, stream = 42, 0
+whole = qx.Gauss2026(1000, 1.0, key, stream, 0.0)
+part = qx.Gauss2026(10, 1.0, key, stream, 500.0)  # from position 500 on
+print("the same:", bool((part == whole[500:510]).all()))
+channels = np.array([qx.White2026(20000, 1.0, key, one, 0.0) for one in range(3)])
+print(np.corrcoef(channels).round(3))

@@ -1421,6 +1421,26 @@ def BinomialNoiseH(n: int, trials: int, p: float, seed: int, state: Mapping[str,
     """Binomial noise: numbers of successes in `trials` trials of probability p."""
 
 
+def White2026(n: int, amplitude: float, key: int, stream: int, position: float) -> NDArray[np.float64]:
+    """Uniform white noise: x[i] = amplitude (2 u - 1), n samples in (-amplitude, amplitude); u is (m + ..."""
+
+
+def Gauss2026(n: int, sigma: float, key: int, stream: int, position: float) -> NDArray[np.float64]:
+    """Gaussian white noise of mean 0 and standard deviation sigma: the quantile of a uniform number, ..."""
+
+
+def Gamma2026(n: int, shape: float, key: int, stream: int, position: float) -> NDArray[np.float64]:
+    """Gamma noise of any shape above 0, with density x^(shape - 1) exp(-x) / Gamma(shape): by ..."""
+
+
+def Poisson2026(n: int, mean: float, key: int, stream: int, position: float) -> NDArray[np.float64]:
+    """Poisson noise of means to 1e15: below a mean of 10 by the sum of probabilities, above by ..."""
+
+
+def Binomial2026(n: int, trials: float, p: float, key: int, stream: int, position: float) -> NDArray[np.float64]:
+    """Binomial noise: numbers of successes in `trials` trials of probability p, trials a whole number ..."""
+
+
 def Median_head(x: ArrayLike) -> float:
     """Median: the middle value, or the mean of the two middle values."""
 
@@ -1771,6 +1791,22 @@ def RiffleIntNum2012_head(count: int, seed: int, state: Mapping[str, Any], unbia
 
 def RiffleIntNum_head(count: int, seed: int, state: Mapping[str, Any]) -> tuple[NDArray[np.int32], dict[str, Any]]:
     """As RiffleIntNum2012_head, biased. A random order of 0 to count - 1; without bias if `unbiased` ..."""
+
+
+def RiffleArrayDBL2026_head(x: ArrayLike, key: int, stream: int, position: float) -> tuple[NDArray[np.float64], NDArray[np.int32]]:
+    """Shuffles x without bias; the numbers by D."""
+
+
+def RiffleArrayCDB2026_head(x: ArrayLike, key: int, stream: int, position: float) -> tuple[NDArray[np.complex128], NDArray[np.int32]]:
+    """As RiffleArrayDBL2026_head, for complex elements. Shuffles x without bias; the numbers by D."""
+
+
+def RiffleArrayInt2026_head(x: ArrayLike, key: int, stream: int, position: float) -> tuple[NDArray[np.int32], NDArray[np.int32]]:
+    """As RiffleArrayDBL2026_head, for integers. Shuffles x without bias; the numbers by D."""
+
+
+def RiffleIntNum2026_head(count: int, key: int, stream: int, position: float) -> NDArray[np.int32]:
+    """A random order of 0 to count - 1, as RiffleArrayDBL2026_head makes it."""
 
 
 def SavitzkyGolayCoefH(order: int, frame: int, weights: ArrayLike, wantDifferentiators: int) -> tuple[NDArray[np.float64], NDArray[np.float64]]:

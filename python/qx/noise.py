@@ -1,16 +1,18 @@
 """Noise of several distributions, repeatable by its seed.
 
-A function with a seed returns the same values each time; without one a start is drawn from the system. A
+A function with a seed returns the same values each time; without one a key is drawn from the system. A
 `Generator` goes on from call to call, so that blocks are those of one piece.
 
-The uniform numbers are those of B. A. Wichmann and I. D. Hill, "Algorithm AS 183: An efficient and
-portable pseudo-random number generator", 1982. Streams of different seeds are not independent; for several
-channels go on with one generator.
+The numbers come from a counter: J. K. Salmon, M. A. Moraes, R. O. Dror and D. E. Shaw, "Parallel random
+numbers: as easy as 1, 2, 3", 2011. Each value is a function of seed, stream, position and kind of noise, so
+that any position is reached at once, and streams and seeds are independent: for several channels or
+processes take one seed and a stream for each.
 """
 
 from __future__ import annotations
 
 import copy
+import math
 import os
 from typing import Any
 
@@ -24,8 +26,8 @@ __all__ = ["Generator", "binomial", "gamma", "gaussian", "periodic", "permutatio
 
 core = served("noise")
 
-MODULI = (30269, 30307, 30323)
 LARGEST_SEED = 2**31 - 1
+MOST_EVENTS = 1e15
 
 
 class Generator:
@@ -34,8 +36,14 @@ class Generator:
     Parameters
     ----------
     seed : int, optional
-        From 1 to 2^31 - 1, for numbers that can be repeated; without one the start is drawn from the
-        system.
+        From 1 to 2^31 - 1, for numbers that can be repeated; without one it is drawn from the system.
+    stream : int
+        From 0 to 2^31 - 1: independent sequences of the same seed.
+
+    Attributes
+    ----------
+    position : int
+        How many values have been drawn; may be set, to go anywhere.
 
     Examples
     --------
@@ -44,79 +52,85 @@ class Generator:
     >>> first, then = source.gaussian(3), source.gaussian(3)
     >>> bool((qx.noise.gaussian(6, seed=7)[3:] == then).all())
     True
+    >>> source.position = 0
+    >>> bool((source.gaussian(3) == first).all())
+    True
     """
 
-    def __init__(self, seed: int | None = None) -> None:
+    def __init__(self, seed: int | None = None, stream: int = 0) -> None:
         if seed is not None:
             seed = whole_number("noise.Generator", "seed", seed, 1, "ErrCountNotPositive")
-            if seed > LARGEST_SEED:
-                refuse("noise.Generator", "seed", f"must be at most {LARGEST_SEED}; {seed} came")
+        self.stream = whole_number("noise.Generator", "stream", stream, 0)
+        for name, value in (("seed", seed or 0), ("stream", self.stream)):
+            if value > LARGEST_SEED:
+                refuse("noise.Generator", name, f"must be at most {LARGEST_SEED}; {value} came")
         self.seed = seed
         self.reset()
 
     def reset(self) -> None:
         """Begins anew: with the same numbers where there is a seed."""
-        self._seed, self._spare, self._cache = self.seed or 0, {}, {}
-        self._state = {} if self.seed else {name: 1 + int.from_bytes(os.urandom(8), "little") % (modulus - 1)
-                                            for name, modulus in zip(("s1", "s2", "s3"), MODULI)}
+        self._key = self.seed or 1 + int.from_bytes(os.urandom(8), "little") % LARGEST_SEED
+        self.position = 0
+        self._periodic: dict[str, int] = {}  # the state of periodic noise, once there is some
 
     def copy(self) -> Any:
         """A generator that gives the same numbers from here on."""
         return copy.deepcopy(self)
 
-    def _begun(self) -> Any:
-        """The seed for the next call: its own for the first one, then 0, which goes on."""
-        seed, self._seed = self._seed, 0
-        return seed
+    def _place(self, n: int) -> tuple[int, int, float]:
+        """Where n values begin; the next ones come after them."""
+        start = self.position
+        self.position += n
+        return self._key, self.stream, float(start)
 
     def uniform(self, n: Any, amplitude: Any = 1.0) -> Any:
-        """n values spread evenly over -amplitude to below amplitude."""
+        """n values spread evenly between -amplitude and amplitude."""
         n = whole_number("noise.uniform", "n", n, 1)
-        x, self._state = core.uniform(n, float(amplitude), self._begun(), self._state)
-        return x
+        return core.uniform(n, float(amplitude), *self._place(n))
 
     def gaussian(self, n: Any, sigma: Any = 1.0) -> Any:
         """n values of a normal distribution of mean 0 and standard deviation sigma."""
         n = whole_number("noise.gaussian", "n", n, 1)
-        x, self._state, self._spare = core.gaussian(n, float(sigma), self._begun(), self._state, self._spare)
-        return x
+        return core.gaussian(n, float(sigma), *self._place(n))
 
     def periodic(self, n: Any, amplitude: Any = 1.0) -> Any:
         """One period of n values of cosines of this amplitude at all whole frequencies, with random
-        phases."""
+        phases. The phases come from a generator of their own, that of B. A. Wichmann and I. D. Hill (1982),
+        and neither stream nor position matters."""
         n = whole_number("noise.periodic", "n", n, 1)
-        x, self._state = core.periodic(n, float(amplitude), self._begun(), self._state)
+        seed = 0 if self._periodic else self._key
+        x, self._periodic = core.periodic(n, float(amplitude), seed, self._periodic)
         return x
 
     def gamma(self, n: Any, order: Any = 1) -> Any:
-        """n waiting times for `order` events of a Poisson process of rate 1."""
+        """n values of a gamma distribution of shape `order`: of a whole one, waiting times for so many
+        events of a Poisson process of rate 1."""
         n = whole_number("noise.gamma", "n", n, 1)
-        order = whole_number("noise.gamma", "order", order, 1, "ErrInvalidSelector")
-        x, self._state = core.gamma(n, order, self._begun(), self._state)
-        return x
+        if not 0 < order < math.inf:
+            refuse("noise.gamma", "order", f"must be above 0 and finite; {order} came", "ErrInvalidSelector")
+        return core.gamma(n, float(order), *self._place(n))
 
     def poisson(self, n: Any, mean: Any = 1.0) -> Any:
-        """n numbers of events whose mean is given."""
+        """n numbers of events whose mean is given, up to 1e15."""
         n = whole_number("noise.poisson", "n", n, 1)
-        if not mean >= 0:
-            refuse("noise.poisson", "mean", f"must be at least 0; {mean} came")
-        x, self._state = core.poisson(n, float(mean), self._begun(), self._state)
-        return x
+        if not 0 <= mean <= MOST_EVENTS:
+            refuse("noise.poisson", "mean", f"must be from 0 to {MOST_EVENTS:g}; {mean} came")
+        return core.poisson(n, float(mean), *self._place(n))
 
     def binomial(self, n: Any, trials: Any = 1, p: Any = 0.5) -> Any:
-        """n numbers of successes among trials of probability p."""
+        """n numbers of successes among trials of probability p, of up to 2^52 trials."""
         n = whole_number("noise.binomial", "n", n, 1)
         trials = whole_number("noise.binomial", "trials", trials, 0, "ErrInvalidSelector")
+        if trials > 2**52:
+            refuse("noise.binomial", "trials", f"must be at most 2^52; {trials} came")
         if not 0 <= p <= 1:
             refuse("noise.binomial", "p", f"must be from 0 to 1; {p} came")
-        x, self._state, self._cache = core.binomial(n, trials, float(p), self._begun(), self._state, self._cache)
-        return x.astype(np.int64)
+        return core.binomial(n, float(trials), float(p), *self._place(n)).astype(np.int64)
 
     def permutation(self, n: Any) -> Any:
         """0 to n - 1 in a random order, all orders equally likely."""
         n = whole_number("noise.permutation", "n", n, 1)
-        x, self._state = core.permutation(n, self._begun(), self._state, 1)
-        return x
+        return core.permutation(n, *self._place(n))
 
     def shuffle(self, x: Any) -> Any:
         """The elements of x, along the first axis, in a random order."""
@@ -125,7 +139,7 @@ class Generator:
 
 
 def uniform(n: int, amplitude: float = 1.0, seed: int | None = None) -> NDArray[Any]:
-    """Uniform white noise: values spread evenly over -amplitude to below amplitude.
+    """Uniform white noise: values spread evenly between -amplitude and amplitude.
 
     Parameters
     ----------
@@ -149,13 +163,13 @@ def uniform(n: int, amplitude: float = 1.0, seed: int | None = None) -> NDArray[
     --------
     >>> import qx
     >>> qx.noise.uniform(3, seed=1).round(6)
-    array([-0.005436,  0.031277,  0.635329])
+    array([-0.765489,  0.323343,  0.17998 ])
     """
     return Generator(seed).uniform(n, amplitude)
 
 
 def gaussian(n: int, sigma: float = 1.0, seed: int | None = None) -> NDArray[Any]:
-    """Gaussian white noise of mean 0, by the polar method of G. Marsaglia and T. A. Bray, 1964.
+    """Gaussian white noise of mean 0, by the inverse of the distribution.
 
     Parameters
     ----------
@@ -179,7 +193,7 @@ def gaussian(n: int, sigma: float = 1.0, seed: int | None = None) -> NDArray[Any
     --------
     >>> import qx
     >>> qx.noise.gaussian(3, seed=1).round(6)
-    array([ 3.659959, -0.636107, -0.378626])
+    array([-0.203483, -0.55649 , -0.796057])
     """
     return Generator(seed).gaussian(n, sigma)
 
@@ -215,15 +229,15 @@ def periodic(n: int, amplitude: float = 1.0, seed: int | None = None) -> NDArray
     return Generator(seed).periodic(n, amplitude)
 
 
-def gamma(n: int, order: int = 1, seed: int | None = None) -> NDArray[Any]:
-    """Gamma noise: waiting times for `order` events of a Poisson process of rate 1.
+def gamma(n: int, order: float = 1, seed: int | None = None) -> NDArray[Any]:
+    """Gamma noise: of a whole order, waiting times for so many events of a Poisson process of rate 1.
 
     Parameters
     ----------
     n : int
         How many values.
-    order : int
-        How many events; mean and variance.
+    order : float
+        The shape, above 0: how many events; mean and variance.
     seed : int, optional
         From 1 to 2^31 - 1, for values that can be repeated.
 
@@ -240,7 +254,7 @@ def gamma(n: int, order: int = 1, seed: int | None = None) -> NDArray[Any]:
     --------
     >>> import qx
     >>> qx.noise.gamma(3, 2, seed=1).round(6)
-    array([1.360947, 1.114181, 1.890588])
+    array([2.312407, 1.491892, 1.637872])
     """
     return Generator(seed).gamma(n, order)
 
@@ -253,7 +267,7 @@ def poisson(n: int, mean: float = 1.0, seed: int | None = None) -> NDArray[Any]:
     n : int
         How many values.
     mean : float
-        The mean number.
+        The mean number, up to 1e15.
     seed : int, optional
         From 1 to 2^31 - 1, for values that can be repeated.
 
@@ -270,7 +284,7 @@ def poisson(n: int, mean: float = 1.0, seed: int | None = None) -> NDArray[Any]:
     --------
     >>> import qx
     >>> qx.noise.poisson(5, 3.0, seed=1)
-    array([4., 5., 3., 4., 2.])
+    array([7., 3., 3., 3., 1.])
     """
     return Generator(seed).poisson(n, mean)
 
@@ -283,7 +297,7 @@ def binomial(n: int, trials: int = 1, p: float = 0.5, seed: int | None = None) -
     n : int
         How many values.
     trials : int
-        How many trials each number counts.
+        How many trials each number counts, up to 2^52.
     p : float
         The probability of a success.
     seed : int, optional
@@ -302,7 +316,7 @@ def binomial(n: int, trials: int = 1, p: float = 0.5, seed: int | None = None) -
     --------
     >>> import qx
     >>> qx.noise.binomial(5, 10, 0.5, seed=1)
-    array([3, 6, 5, 5, 6])
+    array([3, 5, 7, 8, 4])
     """
     return Generator(seed).binomial(n, trials, p)
 
@@ -331,7 +345,7 @@ def permutation(n: int, seed: int | None = None) -> NDArray[np.int32]:
     --------
     >>> import qx
     >>> qx.noise.permutation(5, seed=1)
-    array([1, 0, 3, 4, 2], dtype=int32)
+    array([1, 3, 2, 4, 0], dtype=int32)
     """
     return Generator(seed).permutation(n)
 
@@ -359,6 +373,6 @@ def shuffle(x: ArrayLike, seed: int | None = None) -> NDArray[Any]:
     --------
     >>> import qx
     >>> qx.noise.shuffle([1.5, 2.5, 3.5], seed=1)
-    array([1.5, 3.5, 2.5])
+    array([2.5, 1.5, 3.5])
     """
     return Generator(seed).shuffle(x)

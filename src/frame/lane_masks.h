@@ -39,6 +39,26 @@ QX_INLINE Lanes<N> Sqrt(Lanes<N> x) {
     return root;
 }
 
+// The products of the lower halves of each 64 bits as unsigned integers, in full.
+template <class L>
+QX_INLINE BitsOf<L> ProductOfLowerHalves(BitsOf<L> a, BitsOf<L> b) {
+    if constexpr (L::count == 2)
+        return (BitsOf<L>)_mm_mul_epu32((__m128i)a, (__m128i)b);
+#ifdef __AVX2__
+    else
+        return (BitsOf<L>)_mm256_mul_epu32((__m256i)a, (__m256i)b);
+#else
+    else
+        return (a & 0xffffffff) * (b & 0xffffffff);
+#endif
+}
+// Shifted towards the lower bits, with zeros behind.
+template <class L>
+QX_INLINE BitsOf<L> ShiftedDown(BitsOf<L> bits, int count) {
+    typedef uint64_t Unsigned __attribute__((vector_size(sizeof(BitsOf<L>))));
+    return (BitsOf<L>)((Unsigned)bits >> count);
+}
+
 // A truth for each lane. Comparisons with NaN are false.
 template <class L>
 struct LaneMask {

@@ -2,7 +2,10 @@
 #define QX_UTIL_SHUFFLE_H
 
 #include "frame/elements.h"
+#include "signal/counter_noise.h"
 #include "signal/random.h"
+
+#include <algorithm>
 
 #include <cstdint>
 
@@ -19,6 +22,26 @@ void Shuffle(int32_t n, bool isUnbiased, RandomState &state, const Exchange &exc
         // kept: every element changes places with any, which is biased.
         for (int32_t i = 0; i < n; ++i)
             exchange(i, static_cast<int32_t>(stream.next() * n));
+    }
+}
+
+// The same without bias, by numbers of a counter: element i, from the last down to 1, changes places
+// with one of the elements 0 to i, which the block i values on decides.
+template <class Exchange>
+void CounterShuffle(int32_t n, const NoisePlace &place, const Exchange &exchange) {
+    constexpr int32_t atOnce = 256;
+    uint64_t a[atOnce], b[atOnce];
+    for (int32_t last = n - 1; last > 0;) {
+        const int32_t first = std::max(1, last - atOnce + 1);
+        NoisePlace piece = place;
+        piece.position += static_cast<uint64_t>(first);
+        PhiloxBlocks(piece, last - first + 1, a, b);
+        for (int32_t i = last; i >= first; --i) {
+            const auto count = static_cast<uint32_t>(i) + 1;
+            const uint32_t j = CounterIndex(a[i - first], count, place, static_cast<uint64_t>(i));
+            exchange(i, static_cast<int32_t>(j));
+        }
+        last = first - 1;
     }
 }
 

@@ -68,8 +68,8 @@ NEWEST = {
         "standardize": "Norm1", "rescale": "Scale1DCIN",
     },
     "noise": {
-        "uniform": "white", "gaussian": "Gauss", "periodic": "PeriodNoise", "gamma": "GammaNoiseH",
-        "poisson": "PoissonNoiseH", "binomial": "BinomialNoiseH", "permutation": "RiffleIntNum2012_head",
+        "uniform": "White2026", "gaussian": "Gauss2026", "periodic": "PeriodNoise", "gamma": "Gamma2026",
+        "poisson": "Poisson2026", "binomial": "Binomial2026", "permutation": "RiffleIntNum2026_head",
     },
     "multirate": {
         "respace": "Resample_Const", "respace_complex": "CxResample_Const",

@@ -61,6 +61,19 @@ std::vector<Recipe> NoiseRecipes() {
         Binomial("BinomialNoiseH: trials", 24, 0.7),
         Binomial("BinomialNoiseH: counted", 25, 0.03),
         Binomial("BinomialNoiseH: rejection", 100, 0.6),
+        {"White2026", [](Call &c) { return White2026(c.out<DBL>(0), c.n, 1.5, 7, -c.n, 1e10); }},
+        {"Gauss2026", [](Call &c) { return Gauss2026(c.out<DBL>(0), c.n, 2.0, -7, c.n, 12.0); }},
+        {"Gamma2026", [](Call &c) { return Gamma2026(c.out<DBL>(0), c.n, 2.5, 7, c.n, 12.0); }},
+        {"Gamma2026: below 1",
+         [](Call &c) { return Gamma2026(c.out<DBL>(0), c.n, 0.3, 7, c.n, 0.0); }},
+        {"Poisson2026: sum",
+         [](Call &c) { return Poisson2026(c.out<DBL>(0), c.n, 4.5, 7, 1, 0.0); }},
+        {"Poisson2026: rejection",
+         [](Call &c) { return Poisson2026(c.out<DBL>(0), c.n, 1e6 + 0.25, 7, 1, 3.0); }},
+        {"Binomial2026: sum",
+         [](Call &c) { return Binomial2026(c.out<DBL>(0), c.n, 30.0, 0.9, 7, 1, 0.0); }},
+        {"Binomial2026: rejection",
+         [](Call &c) { return Binomial2026(c.out<DBL>(0), c.n, 1e9, 0.3, 7, 1, 3.0); }},
     };
 }
 

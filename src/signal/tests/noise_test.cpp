@@ -1,6 +1,10 @@
 #include "qx/qx.h"
+#include "signal/philox.h"
 #include "signal/random.h"
+#include "special/gamma.h"
 #include "tests/support/hostile_host.h"
+#include "tests/support/table.h"
+#include "tests/support/test_data.h"
 
 #include <gtest/gtest.h>
 
@@ -9,6 +13,7 @@
 #include <complex>
 #include <functional>
 #include <limits>
+#include <map>
 #include <numbers>
 #include <numeric>
 #include <vector>
@@ -503,6 +508,263 @@ TEST(Noises, CodesComeInTheirOrder) {
         EXPECT_EQ(counts.size(), 0);
     }
     EXPECT_EQ(state.s1, start.s1) << "a failure draws nothing and seeds nothing";
+}
+
+// The noise of 2026.
+
+Samples Of(const std::function<ErrorCode(DBL1D)> &call) {
+    DBLArray x;
+    EXPECT_EQ(call(x.handle()), 0);
+    return x.values();
+}
+
+// Each call as a function of the number of values and of the place.
+typedef std::function<Samples(int32_t n, int32_t key, int32_t stream, double position)> Source;
+const std::vector<std::pair<const char *, Source>> sources = {
+    {"white",
+     [](int32_t n, int32_t key, int32_t stream, double at) {
+         return Of([=](DBL1D x) { return White2026(x, n, 2.0, key, stream, at); });
+     }},
+    {"Gauss",
+     [](int32_t n, int32_t key, int32_t stream, double at) {
+         return Of([=](DBL1D x) { return Gauss2026(x, n, 3.0, key, stream, at); });
+     }},
+    {"gamma",
+     [](int32_t n, int32_t key, int32_t stream, double at) {
+         return Of([=](DBL1D x) { return Gamma2026(x, n, 0.6, key, stream, at); });
+     }},
+    {"Poisson",
+     [](int32_t n, int32_t key, int32_t stream, double at) {
+         return Of([=](DBL1D x) { return Poisson2026(x, n, 1e7, key, stream, at); });
+     }},
+    {"binomial",
+     [](int32_t n, int32_t key, int32_t stream, double at) {
+         return Of([=](DBL1D x) { return Binomial2026(x, n, 1e8, 0.7, key, stream, at); });
+     }},
+};
+
+// The known answers of the publication, and what a generic text of the definition gives, which has
+// NumPy's bits in its form of 64-bit words (make_philox.py).
+TEST(CounterNoise, HasTheKnownBlocks) {
+    const qx::NoiseBlock zeros = qx::PhiloxBlock({0, 0, 0, qx::NoiseKind{0}}, 0, 0);
+    EXPECT_EQ(zeros.a, 0xe169c58d6627e8d5);
+    EXPECT_EQ(zeros.b, 0x9b00dbd8bc57ac4c);
+    const qx::NoiseBlock ones =
+        qx::PhiloxBlock({-1, -1, ~uint64_t{0}, qx::NoiseKind{0xffffffff}}, 0, 0xffffffff);
+    EXPECT_EQ(ones.a, 0x41c83b0e408f276d);
+    EXPECT_EQ(ones.b, 0x6d5451fda20bc7c6);
+    const qx::NoiseBlock digits = qx::PhiloxBlock({static_cast<int32_t>(0xa4093822), 0x299f31d0,
+                                                   0x85a308d3243f6a88, qx::NoiseKind{0x03707344}},
+                                                  0, 0x13198a2e);
+    EXPECT_EQ(digits.a, 0x94fdcceb'd16cfe09);
+    EXPECT_EQ(digits.b, 0x24126ea1'5001e420);
+    for (const auto &row : qx::test::ReadTable(qx::test::TestData("philox.dat"))) {
+        const auto &v = row.arguments;
+        const qx::NoisePlace place = {static_cast<int32_t>(v[0]), static_cast<int32_t>(v[1]),
+                                      static_cast<uint64_t>(v[2]),
+                                      static_cast<qx::NoiseKind>(static_cast<uint32_t>(v[3]))};
+        const qx::NoiseBlock one = qx::PhiloxBlock(place, 0, 0);
+        EXPECT_EQ(one.a >> 32, static_cast<uint64_t>(v[4])) << row.text;
+        EXPECT_EQ(one.b & 0xffffffff, static_cast<uint64_t>(row.value)) << row.text;
+        uint64_t a[8], b[8];
+        qx::PhiloxBlocks(place, 7, a, b);
+        for (uint64_t i = 0; i < 7; ++i) {
+            EXPECT_EQ(a[i], qx::PhiloxBlock(place, i, 0).a) << row.text;
+            EXPECT_EQ(b[i], qx::PhiloxBlock(place, i, 0).b) << row.text;
+        }
+    }
+}
+
+// Any place at once: parts, also single values, are those of one piece, past 2^32 as well.
+TEST(CounterNoise, IsTheSameInParts) {
+    for (const auto &[name, source] : sources)
+        for (const double at : {0.0, 4294967000.0, 0x1p53 - 1000}) {
+            const Samples whole = source(1000, 5, -3, at);
+            for (const int32_t size : {1, 3, 97, 256, 333}) {
+                const auto first = static_cast<std::size_t>(size) * 2;
+                const Samples part = source(size, 5, -3, at + 2.0 * size);
+                ASSERT_TRUE(std::equal(part.begin(), part.end(),
+                                       whole.begin() + static_cast<std::ptrdiff_t>(first)))
+                    << name << " " << at << " " << size;
+            }
+            EXPECT_NE(source(1000, 6, -3, at), whole) << name;
+            EXPECT_NE(source(1000, 5, -2, at), whole) << name;
+        }
+}
+
+// The greatest distance of the distribution of the values from the exact one, times the root of their
+// number: above 1.95 for 1 of 1000 good generators.
+double KolmogorovSmirnov(Samples x, const std::function<double(double)> &cdf) {
+    std::sort(x.begin(), x.end());
+    const double n = static_cast<double>(x.size());
+    double distance = 0;
+    for (std::size_t i = 0; i < x.size(); ++i) {
+        const double exact = cdf(x[i]), below = static_cast<double>(i) / n;
+        distance = std::max({distance, exact - below, below + 1 / n - exact});
+    }
+    return distance * std::sqrt(n);
+}
+
+double NormalCdf(double x) { return 0.5 * std::erfc(-x / std::numbers::sqrt2); }
+
+TEST(CounterNoise, FollowsItsContinuousDistributions) {
+    constexpr int32_t n = 200000;
+    for (const int32_t key : {1, 77, -5}) {
+        const Samples u = sources[0].second(n, key, 0, 0.0);
+        EXPECT_LT(KolmogorovSmirnov(u, [](double x) { return (x + 2) / 4; }), 1.95);
+        const Samples z = sources[1].second(n, key, 0, 0.0);
+        EXPECT_LT(KolmogorovSmirnov(z, [](double x) { return NormalCdf(x / 3); }), 1.95);
+        for (const double shape : {0.05, 0.5, 1.0, 1.5, 3.0, 40.0}) {
+            const Samples g = Of([&](DBL1D x) { return Gamma2026(x, n / 8, shape, key, 0, 0.0); });
+            EXPECT_LT(
+                KolmogorovSmirnov(g, [&](double x) { return qx::IncompleteGammaP(shape, x); }),
+                1.95)
+                << shape << " " << key;
+        }
+    }
+    // Quantiles: each sample has the uniform number of its block, tails included.
+    double worst = 0;
+    const Samples z = Of([](DBL1D x) { return Gauss2026(x, n, 1.0, 3, 4, 0.0); });
+    const qx::NoisePlace place = {3, 4, 0, qx::NoiseKind::Gaussian};
+    for (std::size_t i = 0; i < z.size(); ++i) {
+        const double u = qx::CentredUniform(qx::PhiloxBlock(place, i, 0).a);
+        const double tail = 0.5 - std::fabs(u); // exact
+        if (tail > 0.49 || tail < 0x1p-12)
+            continue;
+        const double error = 0.5 * std::erfc(std::fabs(z[i]) / std::numbers::sqrt2) / tail - 1;
+        worst = std::max(worst, std::fabs(error));
+        ASSERT_EQ(z[i] > 0, u > 0);
+    }
+    EXPECT_LT(worst, 1e-14);
+    for (const uint64_t m : {uint64_t{0}, uint64_t{1} << 12, uint64_t{5} << 30, uint64_t{1} << 51})
+        for (const uint64_t b : {uint64_t{0}, uint64_t{1} << 40, ~uint64_t{0}}) {
+            const double x = qx::NormalTailQuantile({m, b});
+            const double tail =
+                (static_cast<double>(m >> 12) + (static_cast<double>(b) + 0.5) * 0x1p-64) * 0x1p-52;
+            EXPECT_NEAR(0.5 * std::erfc(-x / std::numbers::sqrt2) / tail, 1.0, 2e-13) << m;
+            EXPECT_EQ(qx::NormalTailQuantile({~m, b}), -x);
+        }
+}
+
+// Chi-square over the numbers with an expectation of 20 or more, of which the rest is one: as a
+// standard normal number (E. B. Wilson and M. M. Hilferty, 1931).
+double ChiSquare(const Samples &x, const std::function<double(double)> &lnProbability, double from,
+                 double to) {
+    const double n = static_cast<double>(x.size());
+    std::map<double, double> counts;
+    for (const double value : x)
+        counts[value] += 1;
+    double sum = 0, cells = 0, left = n, leftCount = n;
+    for (double k = from; k <= to; ++k) {
+        const double expected = n * std::exp(lnProbability(k));
+        if (expected < 20)
+            continue;
+        sum += (counts[k] - expected) * (counts[k] - expected) / expected;
+        cells += 1;
+        left -= expected;
+        leftCount -= counts[k];
+    }
+    if (left > 5)
+        sum += (leftCount - left) * (leftCount - left) / left;
+    const double freedom = left > 5 ? cells : cells - 1, spread = 2 / (9 * freedom);
+    return (std::cbrt(sum / freedom) - (1 - spread)) / std::sqrt(spread);
+}
+
+TEST(CounterNoise, FollowsItsDiscreteDistributions) {
+    constexpr int32_t n = 300000;
+    for (const double mean : {0.2, 3.0, 9.99, 10.0, 47.3, 800.0}) {
+        const Samples k = Of([&](DBL1D x) { return Poisson2026(x, n, mean, 9, 1, 0.0); });
+        const double chi = ChiSquare(
+            k, [&](double j) { return j * std::log(mean) - mean - std::lgamma(j + 1); }, 0, 2000);
+        EXPECT_LT(std::fabs(chi), 3.3) << mean;
+    }
+    struct Trials {
+        double trials, p;
+    };
+    for (const auto &[trials, p] :
+         {Trials{1, 0.25}, Trials{40, 0.2}, Trials{40, 0.8}, Trials{40, 0.26}, Trials{25, 0.5},
+          Trials{3000, 0.3}, Trials{1e6, 1e-5}, Trials{1e6, 0.9999}}) {
+        const Samples k = Of([&](DBL1D x) { return Binomial2026(x, n, trials, p, 9, 2, 0.0); });
+        const auto lnProbability = [&](double j) {
+            return std::lgamma(trials + 1) - std::lgamma(j + 1) - std::lgamma(trials - j + 1) +
+                   j * std::log(p) + (trials - j) * std::log1p(-p);
+        };
+        const double middle = trials * p;
+        EXPECT_LT(std::fabs(ChiSquare(k, lnProbability, std::max(0.0, std::floor(middle) - 500),
+                                      std::min(trials, middle + 500))),
+                  3.3)
+            << trials << " " << p;
+    }
+    EXPECT_EQ(Of([](DBL1D x) { return Binomial2026(x, 3, 7, 1.0, 9, 2, 0.0); }), Samples(3, 7.0));
+    EXPECT_EQ(Of([](DBL1D x) { return Binomial2026(x, 3, 7, 0.0, 9, 2, 0.0); }), Samples(3, 0.0));
+    EXPECT_EQ(Of([](DBL1D x) { return Poisson2026(x, 3, 0.0, 9, 2, 0.0); }), Samples(3, 0.0));
+}
+
+// At large means the distribution is normal up to the skewness, which shifts it by 1 / (6 sigma); mean
+// and variance stay exact where the elder's deviation is 10 % too large.
+TEST(CounterNoise, IsExactAtLargeMeans) {
+    constexpr int32_t n = 400000;
+    const auto standard = [](Samples x, double mean, double deviation) {
+        for (double &value : x) {
+            EXPECT_EQ(value, std::floor(value));
+            value = (value - mean) / deviation;
+        }
+        return x;
+    };
+    for (const double mean : {1e9, 1e12, 1e15}) {
+        const Samples poisson = standard(
+            Of([&](DBL1D x) { return Poisson2026(x, n, mean, 2, 3, 0.0); }), mean, std::sqrt(mean));
+        const Samples binomial =
+            standard(Of([&](DBL1D x) { return Binomial2026(x, n, 4 * mean, 0.25, 2, 3, 0.0); }),
+                     mean, std::sqrt(0.75 * mean));
+        for (const Samples &x : {poisson, binomial}) {
+            EXPECT_LT(KolmogorovSmirnov(x, NormalCdf), 1.95) << mean;
+            double square = 0;
+            for (const double value : x)
+                square += value * value;
+            EXPECT_NEAR(square / n, 1, 5 * std::sqrt(2.0 / n)) << mean;
+        }
+    }
+}
+
+// First values of 10^5 streams, and of as many keys: no correlation with their neighbours, their
+// distance of 2^k, or their number.
+TEST(CounterNoise, HasIndependentStreams) {
+    constexpr int32_t n = 100000;
+    for (const bool byKey : {false, true}) {
+        Samples first;
+        for (int32_t i = 0; i < n; ++i)
+            first.push_back(byKey ? sources[0].second(1, i, 0, 0.0)[0]
+                                  : sources[0].second(1, 0, i, 0.0)[0]);
+        const auto correlation = [&](int32_t distance) {
+            double sum = 0;
+            for (std::size_t i = static_cast<std::size_t>(distance); i < first.size(); ++i)
+                sum += first[i] * first[i - static_cast<std::size_t>(distance)];
+            return sum / (4.0 / 3) / std::sqrt(n - distance); // of deviation 1
+        };
+        for (int32_t distance = 1; distance < n / 2; distance *= 2) {
+            EXPECT_LT(std::fabs(correlation(distance)), 4) << distance;
+            EXPECT_LT(std::fabs(correlation(3 * distance / 2)), 4) << distance;
+        }
+        EXPECT_LT(KolmogorovSmirnov(first, [](double x) { return (x + 2) / 4; }), 1.95);
+    }
+}
+
+TEST(CounterNoise, RefusesWhatItCannotMake) {
+    DBLArray x;
+    const double most = 0x1p53, nan = std::numeric_limits<double>::quiet_NaN();
+    for (const double position : {-1.0, 0.5, most - 2, most, nan, -nan})
+        EXPECT_EQ(Gauss2026(x.handle(), 3, 1.0, 1, 1, position), ErrIndexOutOfRange) << position;
+    EXPECT_EQ(Gauss2026(x.handle(), 3, 1.0, 1, 1, most - 3), 0);
+    EXPECT_EQ(White2026(x.handle(), 0, 1.0, 1, 1, nan), ErrEmptyInput);
+    for (const double shape : {0.0, -1.0, nan, 1 / 0.0})
+        EXPECT_EQ(Gamma2026(x.handle(), 0, shape, 1, 1, 0.0), ErrInvalidSelector);
+    for (const double mean : {-1.0, nan, 1.01e15})
+        EXPECT_EQ(Poisson2026(x.handle(), 0, mean, 1, 1, 0.0), ErrInvalidSelector);
+    for (const double trials : {-1.0, nan, 2.5, 0x1p53})
+        EXPECT_EQ(Binomial2026(x.handle(), 0, trials, 0.5, 1, 1, 0.0), ErrInvalidSelector);
+    for (const double p : {-0.1, nan, 1.1})
+        EXPECT_EQ(Binomial2026(x.handle(), 0, 5, p, 1, 1, 0.0), ErrInvalidSelector);
 }
 
 } // namespace

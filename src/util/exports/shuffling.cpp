@@ -1,6 +1,9 @@
 #include "qx/shuffling.h"
 #include "frame/export.h"
+#include "signal/counter_noise.h"
 #include "util/shuffle.h"
+
+#include <cmath>
 
 namespace qx {
 namespace {
@@ -44,10 +47,54 @@ Outcome RiffleNumbers(Out<I32_1D> indices, int32_t count, int32_t seed, RandomSt
     return Riffle(indices, count, seed, state, unbiased != 0, [](int32_t, int32_t) {});
 }
 
+// Where the orders of 2026 take their numbers: that of element i at the position and i.
+struct Start {
+    int32_t key, stream;
+    double position;
+};
+
+template <class Exchange>
+Outcome CounterRiffle(Out<I32_1D> &indices, int32_t n, const Start &start,
+                      const Exchange &exchange) {
+    const auto &[key, stream, position] = start;
+    const bool hasPlace =
+        position >= 0.0 && position <= 0x1p53 - n && position == std::floor(position);
+    if (const Outcome bad = FirstFailed({{n < 1, ErrEmptyInput}, {!hasPlace, ErrIndexOutOfRange}}))
+        return bad;
+    if (const Outcome bad = indices.resize(n))
+        return bad;
+    I32 *order = indices.data();
+    for (int32_t i = 0; i < n; ++i)
+        order[i] = i;
+    const NoisePlace place = {key, stream, static_cast<uint64_t>(position), NoiseKind::Order};
+    CounterShuffle(n, place, [&](int32_t i, int32_t j) {
+        const int32_t held = order[i];
+        order[i] = order[j];
+        order[j] = held;
+        exchange(i, j);
+    });
+    return 0;
+}
+
+template <class Array>
+Outcome CounterRiffleArray(InOut<Array> x, Out<I32_1D> indices, Start start) {
+    typename HandleTraits<Array>::T *elements = x.data();
+    return CounterRiffle(indices, x.size(), start, [elements](int32_t i, int32_t j) {
+        const auto held = elements[i];
+        elements[i] = elements[j];
+        elements[j] = held;
+    });
+}
+
+Outcome CounterRiffleNumbers(Out<I32_1D> indices, int32_t count, Start start) {
+    return CounterRiffle(indices, count, start, [](int32_t, int32_t) {});
+}
+
 } // namespace
 } // namespace qx
 
 using qx::Returned;
+using qx::Start;
 
 ErrorCode RiffleArrayDBL2012_head(DBL1D x, I32_1D indices, int32_t seed, RandomState *state,
                                   int32_t unbiased) {
@@ -83,4 +130,24 @@ ErrorCode RiffleIntNum2012_head(I32_1D indices, int32_t count, int32_t seed, Ran
 
 ErrorCode RiffleIntNum_head(I32_1D indices, int32_t count, int32_t seed, RandomState *state) {
     return RiffleIntNum2012_head(indices, count, seed, state, 0);
+}
+
+ErrorCode RiffleArrayDBL2026_head(DBL1D x, I32_1D indices, int32_t key, int32_t stream,
+                                  double position) {
+    return Returned(qx::CounterRiffleArray<DBL1D>, x, indices, Start{key, stream, position});
+}
+
+ErrorCode RiffleArrayCDB2026_head(CDB1D x, I32_1D indices, int32_t key, int32_t stream,
+                                  double position) {
+    return Returned(qx::CounterRiffleArray<CDB1D>, x, indices, Start{key, stream, position});
+}
+
+ErrorCode RiffleArrayInt2026_head(I32_1D x, I32_1D indices, int32_t key, int32_t stream,
+                                  double position) {
+    return Returned(qx::CounterRiffleArray<I32_1D>, x, indices, Start{key, stream, position});
+}
+
+ErrorCode RiffleIntNum2026_head(I32_1D indices, int32_t count, int32_t key, int32_t stream,
+                                double position) {
+    return Returned(qx::CounterRiffleNumbers, indices, count, Start{key, stream, position});
 }

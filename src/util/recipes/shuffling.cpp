@@ -33,6 +33,17 @@ std::vector<Recipe> ShufflingRecipes() {
         {"RiffleIntNum2012_head",
          [](Call &c) { return RiffleIntNum2012_head(c.out<I32>(0), c.n, 7, State(c), 1); }},
     };
+    const auto add = [&](const char *name, auto run) { recipes.push_back({name, run}); };
+    add("RiffleIntNum2026_head",
+        [](Call &c) { return RiffleIntNum2026_head(c.out<I32>(0), c.n, 7, 1, 5.0); });
+    add("RiffleArrayDBL2026_head",
+        [](Call &c) { return RiffleArrayDBL2026_head(c.inOut<DBL>(0), c.out<I32>(0), 7, 1, 0.0); });
+    add("RiffleArrayCDB2026_head", [](Call &c) {
+        return RiffleArrayCDB2026_head(c.inOut<CDB>(0), c.out<I32>(0), -7, 1, 1e12);
+    });
+    add("RiffleArrayInt2026_head", [](Call &c) {
+        return RiffleArrayInt2026_head(c.inOut<I32>(0), c.out<I32>(0), 7, -1, 0.0);
+    });
     Add<DBL>(recipes, "RiffleArrayDBL", RiffleArrayDBL_head, RiffleArrayDBL2012_head);
     Add<CDB>(recipes, "RiffleArrayCDB", RiffleArrayCDB_head, RiffleArrayCDB2012_head);
     Add<I32>(recipes, "RiffleArrayInt", RiffleArrayInt_head, RiffleArrayInt2012_head);

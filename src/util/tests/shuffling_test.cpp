@@ -129,4 +129,65 @@ TEST(Shuffles, EmptyArraysAreRefused) {
     EXPECT_EQ(state.s1, start.s1);
 }
 
+Order CounterNumbers(int32_t count, int32_t key, int32_t stream, double position) {
+    I32Array indices(5);
+    EXPECT_EQ(RiffleIntNum2026_head(indices.handle(), count, key, stream, position), 0);
+    return indices.values();
+}
+
+// All 24 orders of 4 numbers by chi-square with 23 degrees of freedom; the place of number 0 among 300
+// by one with 299.
+TEST(CounterShuffles, MakeAllOrdersEquallyLikely) {
+    constexpr int32_t draws = 48000;
+    std::map<Order, int> orders;
+    for (int32_t i = 0; i < draws; ++i)
+        ++orders[CounterNumbers(4, 7, i, 4.0 * i)];
+    EXPECT_EQ(orders.size(), 24U);
+    double chi = 0;
+    for (const auto &[order, count] : orders)
+        chi += (count - draws / 24.0) * (count - draws / 24.0) / (draws / 24.0);
+    EXPECT_LT(chi, 49.8); // 1 of 1000
+    std::vector<double> places(300);
+    for (int32_t i = 0; i < 30000; ++i) {
+        const Order order = CounterNumbers(300, 8, 0, 300.0 * i);
+        places[static_cast<std::size_t>(std::find(order.begin(), order.end(), 0) -
+                                        order.begin())] += 1;
+    }
+    chi = 0;
+    for (const double count : places)
+        chi += (count - 100) * (count - 100) / 100;
+    EXPECT_LT(chi, 381); // 1 of 1000
+}
+
+TEST(CounterShuffles, MoveElementsWithTheirNumbers) {
+    for (const int32_t n : {1, 2, 255, 256, 257, 1000}) {
+        std::vector<double> values(static_cast<std::size_t>(n));
+        std::iota(values.begin(), values.end(), 0.0);
+        DBLArray x(values);
+        I32Array indices, whole(Order(static_cast<std::size_t>(n), 3));
+        CDBArray z(n);
+        for (int32_t i = 0; i < n; ++i) {
+            whole.data()[i] = -i;
+            z.data()[i] = {1.0 * i, -2.0 * i};
+        }
+        EXPECT_EQ(RiffleArrayDBL2026_head(x.handle(), indices.handle(), 5, 6, 1e10), 0);
+        const Order order = CounterNumbers(n, 5, 6, 1e10);
+        EXPECT_EQ(indices.values(), order);
+        EXPECT_EQ(RiffleArrayInt2026_head(whole.handle(), indices.handle(), 5, 6, 1e10), 0);
+        EXPECT_EQ(RiffleArrayCDB2026_head(z.handle(), indices.handle(), 5, 6, 1e10), 0);
+        for (int32_t i = 0; i < n; ++i) {
+            const int32_t from = order[static_cast<std::size_t>(i)];
+            EXPECT_EQ(x[i], from);
+            EXPECT_EQ(whole[i], -from);
+            EXPECT_EQ(z[i].im, -2.0 * from);
+        }
+        Order sorted = order;
+        std::sort(sorted.begin(), sorted.end());
+        for (int32_t i = 0; i < n; ++i)
+            ASSERT_EQ(sorted[static_cast<std::size_t>(i)], i);
+    }
+    I32Array indices;
+    EXPECT_EQ(RiffleIntNum2026_head(indices.handle(), 3, 1, 1, -1.0), ErrIndexOutOfRange);
+}
+
 } // namespace
