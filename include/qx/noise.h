@@ -60,8 +60,8 @@ typedef struct BinomialCache {
 } BinomialCache;
 
 /** Uniform white noise: x[i] = (u - 0.5) (2 amplitude), *n samples in [-amplitude, amplitude). The
-    function result is 0, or the host's status where it refused the resize. Sequences of some seeds have
-    a correlation of 0.5; those of White2026 have none.
+    function result is 0, or the host's status where it refused the resize. Sequences of some seeds
+    have a correlation of 0.5; those of White2026 have none.
     Codes: ErrEmptyInput (*n is below 1), ErrOutOfMemory (the host refused the resize).
     NaN: amplitude in all results. */
 QX_API int32_t white(QX_OUT DBL1D x, QX_IN const int32_t *n, QX_IN const double *amplitude,
@@ -70,8 +70,8 @@ QX_API int32_t white(QX_OUT DBL1D x, QX_IN const int32_t *n, QX_IN const double 
 /** Gaussian white noise of mean 0 and standard deviation *sigma, by the polar method: G. Marsaglia
     and T. A. Bray, "A convenient method for generating normal variables", 1964. Numbers come in
     pairs and the second of a pair is kept in `spare`, unscaled, for the next sample or the next
-    call; a seed above 0 forgets it. Seeds are related as those of white are; those of Gauss2026 are not. The function result is 0, or the host's status where it refused
-    the resize.
+    call; a seed above 0 forgets it. Seeds are related as those of white are; those of Gauss2026
+    are not. The function result is 0, or the host's status where it refused the resize.
     Codes: ErrEmptyInput (*n is below 1), ErrOutOfMemory (the host refused the resize).
     NaN: sigma in all results; spare.spare in some results or in no result. */
 QX_API int32_t Gauss(QX_OUT DBL1D x, QX_IN const int32_t *n, QX_IN const double *sigma,
@@ -90,9 +90,10 @@ QX_API int32_t PeriodNoise(QX_IN const int32_t *n, QX_IN const double *amplitude
                            QX_INOUT RandomState *state);
 
 /** Gamma noise: waiting times for `order` events of a Poisson process of rate 1; mean and variance
-    are `order`. Gamma2026 has any shape, and seeds that are not related. Up to order 5 minus the logarithm of a product of `order` uniform numbers, above by
-    rejection from a Lorentzian: J. H. Ahrens and U. Dieter, "Computer methods for sampling from
-    gamma, beta, Poisson and binomial distributions", 1974.
+    are `order`. Gamma2026 has any shape, and seeds that are not related. Up to order 5 minus the
+    logarithm of a product of `order` uniform numbers, above by rejection from a Lorentzian: J. H.
+    Ahrens and U. Dieter, "Computer methods for sampling from gamma, beta, Poisson and binomial
+    distributions", 1974.
     Codes: ErrInvalidSelector (the order is below 1), ErrEmptyInput (n is below 1), ErrOutOfMemory
     (the host refused the resize). */
 QX_API ErrorCode GammaNoiseH(QX_OUT DBL1D x, int32_t n, int32_t order, int32_t seed,
@@ -102,8 +103,8 @@ QX_API ErrorCode GammaNoiseH(QX_OUT DBL1D x, int32_t n, int32_t order, int32_t s
     of a product of uniform numbers, from there on by rejection from a Lorentzian. A mean that is
     not finite gives NaN. The rejection loses its digits where the mean is large: the standard
     deviation comes out 2.5 % too large at a mean of 1e14, 10 % at 1e15, 2.9 times at 1e16, and
-    beyond that the numbers are no Poisson noise, near 1e308 infinite; Poisson2026 is exact to a mean of
-    1e15.
+    beyond that the numbers are no Poisson noise, near 1e308 infinite; Poisson2026 is exact to a
+    mean of 1e15.
     Codes: ErrInvalidSelector (the mean is negative), ErrEmptyInput (n is below 1), ErrOutOfMemory
     (the host refused the resize).
     NaN: mean in all results. */
@@ -127,33 +128,34 @@ QX_API ErrorCode BinomialNoiseH(QX_OUT U32_1D x, int32_t n, int32_t trials, doub
     number, or above 2^53 - n), ErrOutOfMemory (the host refused the resize). */
 QX_API ErrorCode White2026(QX_OUT DBL1D x, int32_t n, double amplitude, int32_t key, int32_t stream,
                            double position);
-/** Gaussian white noise of mean 0 and standard deviation sigma: the quantile of a uniform number, one
-    sample to one block, by M. J. Wichura, "Algorithm AS 241: The percentage points of the normal
-    distribution", 1988, to 1e-15 of itself. A tail below 2^-12 has 64 bits more, so that samples
-    beyond 8.2 sigma occur as often as they should, to 12.5 sigma.
+/** Gaussian white noise of mean 0 and standard deviation sigma: the quantile of a uniform number,
+    one sample to one block, by M. J. Wichura, "Algorithm AS 241: The percentage points of the
+    normal distribution", 1988, to 1e-15 of itself. A tail below 2^-12 has 64 bits more, so that
+    samples beyond 8.2 sigma occur as often as they should, to 12.5 sigma.
     Codes: ErrEmptyInput (n is below 1), ErrIndexOutOfRange (the position is negative, no whole
     number, or above 2^53 - n), ErrOutOfMemory (the host refused the resize). */
 QX_API ErrorCode Gauss2026(QX_OUT DBL1D x, int32_t n, double sigma, int32_t key, int32_t stream,
                            double position);
-/** Gamma noise of any shape above 0, with density x^(shape - 1) exp(-x) / Gamma(shape): by rejection,
-    G. Marsaglia and W. W. Tsang, "A simple method for generating gamma variables", 2000. Below a
-    shape of 0.002 some samples underflow to 0.
+/** Gamma noise of any shape above 0, with density x^(shape - 1) exp(-x) / Gamma(shape): by
+    rejection, G. Marsaglia and W. W. Tsang, "A simple method for generating gamma variables",
+    2000. Below a shape of 0.002 some samples underflow to 0.
     Codes: ErrInvalidSelector (the shape is not above 0, or not finite), ErrEmptyInput (n is below
     1), ErrIndexOutOfRange (the position is negative, no whole number, or above 2^53 - n),
     ErrOutOfMemory (the host refused the resize). */
 QX_API ErrorCode Gamma2026(QX_OUT DBL1D x, int32_t n, double shape, int32_t key, int32_t stream,
                            double position);
-/** Poisson noise of means to 1e15: below a mean of 10 by the sum of probabilities, above by rejection,
-    W. Hoermann, "The transformed rejection method for generating Poisson random variables", 1993,
-    with probabilities as of C. Loader, "Fast and accurate computation of binomial probabilities",
-    2000, which keep their digits at any mean.
+/** Poisson noise of means to 1e15: below a mean of 10 by the sum of probabilities, above by
+    rejection, W. Hoermann, "The transformed rejection method for generating Poisson random
+    variables", 1993, with probabilities as of C. Loader, "Fast and accurate computation of
+    binomial probabilities", 2000, which keep their digits at any mean.
     Codes: ErrInvalidSelector (the mean is not from 0 to 1e15), ErrEmptyInput (n is below 1),
     ErrIndexOutOfRange (the position is negative, no whole number, or above 2^53 - n),
     ErrOutOfMemory (the host refused the resize). */
 QX_API ErrorCode Poisson2026(QX_OUT DBL1D x, int32_t n, double mean, int32_t key, int32_t stream,
                              double position);
-/** Binomial noise: numbers of successes in `trials` trials of probability p, trials a whole number to
-    2^52. As Poisson2026 otherwise: W. Hoermann, "The generation of binomial random variates", 1993.
+/** Binomial noise: numbers of successes in `trials` trials of probability p, trials a whole number
+    to 2^52. As Poisson2026 otherwise: W. Hoermann, "The generation of binomial random variates",
+    1993.
     Codes: ErrInvalidSelector (trials is not a whole number of 0 to 2^52, or p is not from 0 to 1),
     ErrEmptyInput (n is below 1), ErrIndexOutOfRange (the position is negative, no whole number, or
     above 2^53 - n), ErrOutOfMemory (the host refused the resize). */

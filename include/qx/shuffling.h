@@ -9,17 +9,19 @@
    Otherwise element i, from the first up, changes places with any: not all orders are equally
    likely then. `indices` gives the order: element i was element indices[i] before.
 
-   The shuffles of 2026 have no bias. Their numbers come from the counter-based generator of noise.h,
-   and the order is a function of key, stream, position and the number of elements: another position
-   gives another order, and so do positions that differ by less than that number. */
+   The shuffles of 2026 have no bias. Their numbers come from the counter-based generator of
+   noise.h, and the order is a function of key, stream, position and the number of elements. Orders
+   at positions that differ by less than that number share numbers and are related: go on by it, or
+   take another stream. */
 
 #include "qx/noise.h"
 #include "qx/types.h"
 
 QX_BEGIN_DECLS
 
-/** Shuffles x; without bias if `unbiased` is non-zero. A failure empties both arrays. The generator has a
-    period of 7e12 and related seeds; RiffleArrayDBL2026_head has 2^117 places to begin at.
+/** Shuffles x; without bias if `unbiased` is non-zero. A failure empties both arrays. The
+    generator has a period of 7e12 and related seeds; RiffleArrayDBL2026_head has 2^117 places to
+    begin at.
     Codes: ErrEmptyInput (x is empty), ErrOutOfMemory (the host refused the resize).
     NaN: x in some results. */
 QX_API ErrorCode RiffleArrayDBL2012_head(QX_INOUT DBL1D x, QX_OUT I32_1D indices, int32_t seed,
@@ -49,10 +51,10 @@ QX_API ErrorCode RiffleIntNum_head(QX_OUT I32_1D indices, int32_t count, int32_t
                                    QX_INOUT RandomState *state);
 
 /** Shuffles x without bias; the numbers by D. Lemire, "Fast random integer generation in an
-    interval", 2019, from 64 bits each. A failure empties both
-    arrays.
-    Codes: ErrEmptyInput (x is empty), ErrIndexOutOfRange (the position is negative, no whole number,
-    or above 2^53 less the number of elements), ErrOutOfMemory (the host refused the resize). */
+    interval", 2019, from 64 bits each. A failure empties both arrays.
+    Codes: ErrEmptyInput (x is empty), ErrIndexOutOfRange (the position is negative, no whole
+    number, or above 2^53 less the number of elements), ErrOutOfMemory (the host refused the
+    resize). */
 QX_API ErrorCode RiffleArrayDBL2026_head(QX_INOUT DBL1D x, QX_OUT I32_1D indices, int32_t key,
                                          int32_t stream, double position);
 /** As RiffleArrayDBL2026_head, for complex elements. */

@@ -42,8 +42,8 @@ void StartValues(int32_t n, ComplexVector s) {
     }
 }
 
-// Newton's method for the relations of T. J. Stieltjes: s theta'' - 2 (s + n) theta' + 2 n theta = 0
-// gives sum over j != i of 1 / (s_i - s_j) = 1 + n / s_i. The condition of this system is about
+// Newton's method for the relations of T. J. Stieltjes: s theta'' - 2 (s + n) theta' + 2 n theta =
+// 0 gives sum over j != i of 1 / (s_i - s_j) = 1 + n / s_i. The condition of this system is about
 // 1.4 n, where that of the coefficients of the polynomial grows exponentially.
 ErrorCode Refine(int32_t n, ComplexVector s) {
     ComplexMatrix slopes;

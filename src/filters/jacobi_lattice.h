@@ -7,9 +7,9 @@ namespace qx {
 
 // Jacobi's elliptic functions of a modulus k that is given by the ratio K' / K of its quarter
 // periods, by theta functions (NIST Digital Library of Mathematical Functions, chapters 20 and 22).
-// Their nome is exp(-pi K' / K), or exp(-pi K / K') where that is the smaller one; so four terms are
-// enough, and k, its complement kc and all functions have small relative errors for any modulus,
-// next to 0 and next to 1 as well.
+// Their nome is exp(-pi K' / K), or exp(-pi K / K') where that is the smaller one; so four terms
+// are enough, and k, its complement kc and all functions have small relative errors for any
+// modulus, next to 0 and next to 1 as well.
 class JacobiLattice {
 public:
     explicit JacobiLattice(double periodRatio); // K' / K, above 0

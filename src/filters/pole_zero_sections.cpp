@@ -54,9 +54,9 @@ CDB LargerRoot(CDB q, double A) {
 
 CDB Reciprocal(CDB s) { return CDB{s.re, -s.im} / SquareOf(s); }
 
-// 1 + z1 / z + z2 / z^2 of a pole in S and its conjugate. Next to z = +-1 the value there, |1 -+ z|^2,
-// decides where the resonance is, and it is a small difference of the coefficients: z2 is what
-// makes it right for the z1 that has been rounded.
+// 1 + z1 / z + z2 / z^2 of a pole in S and its conjugate. Next to z = +-1 the value there, |1 -+
+// z|^2, decides where the resonance is, and it is a small difference of the coefficients: z2 is
+// what makes it right for the z1 that has been rounded.
 PoleZeroSections::Denominator DenominatorOf(CDB pole) {
     constexpr double isNear = 0.25;
     const double below = FromOne2(pole), square = SquareOf(pole);

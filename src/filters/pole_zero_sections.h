@@ -21,21 +21,21 @@ constexpr int32_t PolesOf(int32_t type, int32_t order) {
     return type == Lowpass || type == Highpass ? order : 2 * order;
 }
 
-// Turns poles and zeros of an analog lowpass, whose edge is at 1 rad/s, into sections of the digital
-// filter. With S = (z - 1) / (z + 1) and s the variable of the analog filter,
+// Turns poles and zeros of an analog lowpass, whose edge is at 1 rad/s, into sections of the
+// digital filter. With S = (z - 1) / (z + 1) and s the variable of the analog filter,
 //
 //     lowpass s = S / g    highpass s = g / S    bandpass s = (S^2 + A) / (B S)
 //     bandstop s = B S / (S^2 + A)
 //
-// where g = tan(pi fl / fs), A is the product and B the difference of the tangents of both edges. No
-// polynomial is multiplied out and no difference of near numbers is formed: B comes from the sine of
-// the difference, of the two roots of S^2 - 2 q S + A = 0 the larger one comes from a sum and the
-// other one is A divided by it, and 1 - |z|^2 = -4 Re S / |1 - S|^2. So the distances of the poles
-// from the unit circle have small relative errors.
+// where g = tan(pi fl / fs), A is the product and B the difference of the tangents of both edges.
+// No polynomial is multiplied out and no difference of near numbers is formed: B comes from the
+// sine of the difference, of the two roots of S^2 - 2 q S + A = 0 the larger one comes from a sum
+// and the other one is A divided by it, and 1 - |z|^2 = -4 Re S / |1 - S|^2. So the distances of
+// the poles from the unit circle have small relative errors.
 //
 // In a band, the pole farther out goes with the zero farther out. Each section has gain 1 in the
-// middle of the pass band (at 0 Hz, at half the sampling rate, at S = i sqrt(A)); the first one also
-// has the gain that the analog filter has at 0.
+// middle of the pass band (at 0 Hz, at half the sampling rate, at S = i sqrt(A)); the first one
+// also has the gain that the analog filter has at 0.
 class PoleZeroSections {
 public:
     // The edges lie between 0 and half the sampling rate and rise.

@@ -117,8 +117,8 @@ double BySum(double u, double first, double most, const Following &following) {
     return k;
 }
 
-// Hörmann's hat: k = floor((2 a / (1/2 - |u|) + b) u + c), with c in two parts, of which the whole one
-// may be near 2^53.
+// Hörmann's hat: k = floor((2 a / (1/2 - |u|) + b) u + c), with c in two parts, of which the whole
+// one may be near 2^53.
 struct Hat {
     double a, b, whole, part, quick;
 

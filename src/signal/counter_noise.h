@@ -9,8 +9,8 @@ namespace qx {
 // Noise whose every value has counters of its own: x[i] depends on the place, on i and on the
 // parameters alone. Attempts of a rejection take the next counters of the same value.
 
-// shape > 0, finite. G. Marsaglia and W. W. Tsang, "A simple method for generating gamma variables",
-// 2000; below 1 by a value of shape + 1 times a power of a uniform number.
+// shape > 0, finite. G. Marsaglia and W. W. Tsang, "A simple method for generating gamma
+// variables", 2000; below 1 by a value of shape + 1 times a power of a uniform number.
 void CounterGamma(RealVector x, double shape, const NoisePlace &place);
 
 // mean from 0 to mostEvents. Below 10 by the sum of probabilities, from there on by the transformed

@@ -10,8 +10,8 @@ namespace qx {
 
 // The generator Philox4x32-10: J. K. Salmon, M. A. Moraes, R. O. Dror and D. E. Shaw, "Parallel
 // random numbers: as easy as 1, 2, 3", 2011. A block of four words is a function of a counter of
-// four words and a key of two; here the key is (key, stream), and the counter is (position, its upper
-// half, attempt, kind). So each value of each stream and kind of noise has blocks of its own.
+// four words and a key of two; here the key is (key, stream), and the counter is (position, its
+// upper half, attempt, kind). So each value of each stream and kind of noise has blocks of its own.
 
 enum class NoiseKind : uint32_t { Uniform = 1, Gaussian, Gamma, Poisson, Binomial, Order };
 

@@ -25,8 +25,8 @@ void Shuffle(int32_t n, bool isUnbiased, RandomState &state, const Exchange &exc
     }
 }
 
-// The same without bias, by numbers of a counter: element i, from the last down to 1, changes places
-// with one of the elements 0 to i, which the block i values on decides.
+// The same without bias, by numbers of a counter: element i, from the last down to 1, changes
+// places with one of the elements 0 to i, which the block i values on decides.
 template <class Exchange>
 void CounterShuffle(int32_t n, const NoisePlace &place, const Exchange &exchange) {
     constexpr int32_t atOnce = 256;
