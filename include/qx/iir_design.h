@@ -197,7 +197,7 @@ QX_API ErrorCode InvChebyshevCoefs2026(double fs, double fl, double fh, double a
     rate), ErrRippleNotPositive (the ripple is not above 0), ErrAttenuationNotPositive (the
     attenuation is not above 0), ErrRippleAboveAttenuation (the ripple is not below the
     attenuation), ErrOutOfMemory (the host refuses an array), ErrDegenerateValue (frequencies so far
-    apart, or an attenuation so large, that a coefficient leaves the numbers). */
+    apart, or levels so small or large, that a coefficient leaves the numbers). */
 QX_API ErrorCode EllipticCoefs2026(double fs, double fl, double fh, double ripple,
                                    double attenuation, int32_t order, int32_t type, QX_OUT DBL1D a,
                                    QX_OUT DBL1D b, QX_OUT CDB1D zeros, QX_OUT CDB1D poles,

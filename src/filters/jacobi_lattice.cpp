@@ -80,6 +80,8 @@ JacobiFunctions JacobiLattice::byHyperbolic(double fraction) const {
 double EllipticFOfTangent(double t, double kc) {
     double x = 1.0, y = 1.0 + kc * t * (kc * t), z = 1.0 + t * t;
     double mean = (x + y + z) / 3.0;
+    if (!std::isfinite(mean))
+        return kNaN;
     // 408 = (3 2^-53)^(-1/6): the series below is then cut off under the rounding.
     double spread = 408.0 * std::fmax(z - mean, mean - x);
     while (spread >= mean) {

@@ -1,8 +1,8 @@
 #!/usr/bin/python3
 """How far the gains of designed IIR filters are from the definition of their families: the greatest
 difference over the pass band, for the elders' sections of second and fourth order, the sections of the
-revisions of 2026, and SciPy's sections, as the tables of docs/accuracy/filter_design.md. The response of the coefficients as they are stored
-and the definition are both evaluated by mpmath at 40 digits.
+revisions of 2026 and SciPy's sections, as the tables of docs/accuracy/filter_design.md. The response of the
+coefficients as they are stored and the definition are both evaluated by mpmath at 40 digits.
 
 usage: QX_LIBRARY_DIR=build/release PYTHONPATH=python tools/accuracy/filter_design.py
 """

@@ -571,6 +571,7 @@ TEST(IIRDesign2026, RefusesWhatNoFilterHas) {
     cases.push_back({{Chebyshev, 3, Lowpass, 0.1, 0.2, 5e-324}, ErrDegenerateValue});
     cases.push_back({{InvChebyshev, 3, Lowpass, 0.1, 0.2, 1, 4000}, ErrDegenerateValue});
     cases.push_back({{Elliptic, 3, Lowpass, 0.1, 0.2, 1, 4000}, ErrDegenerateValue});
+    cases.push_back({{Elliptic, 3, Lowpass, 0.1, 0.2, 1e-320}, ErrDegenerateValue});
     for (const auto &[design, code] : cases) {
         const PoleZeroCascade made = DesignedByPoles(design);
         EXPECT_EQ(made.err, code) << design.family << " " << design.order << " " << design.type;
