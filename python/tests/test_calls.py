@@ -436,7 +436,7 @@ class Selectors(unittest.TestCase):
                                   "Tri_InvMatrix_head", "CxTri_InvMatrix_head", "CoordRotationEuler_head",
                                   "Euler2Direction_head", "Sylvester_head", "CxSylvester_head",
                                   "Lyapunov_head", "CxLyapunov_head", "GammaNoiseH", "PoissonNoiseH",
-                                  "BinomialNoiseH", "PeakD"})
+                                  "BinomialNoiseH", "Gamma2026", "Poisson2026", "Binomial2026", "PeakD"})
 
 
 class Functions(unittest.TestCase):
