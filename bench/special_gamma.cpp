@@ -1,10 +1,12 @@
 #include "bench/special_peers.h"
 
+#include "frame/constants.h"
 #include "special/beta.h"
 #include "special/digamma.h"
 #include "special/factorial.h"
 #include "special/gamma.h"
 #include "stats/distributions.h"
+#include "stats/tail_distributions.h"
 
 #include <cmath>
 
@@ -31,12 +33,14 @@ double From(Routine routine, Arguments... arguments) {
     return value;
 }
 
+constexpr auto kSurvival = DistributionValue::Survival;
+
 int32_t Int(double x) { return static_cast<int32_t>(x); }
 
 } // namespace
 
 // The quantiles by bisection and the normal distribution by low-order formulas answer another
-// question than their peers do, so they come last, without one.
+// question than their peers do, so they have none; their revisions come last.
 std::vector<SpecialRow> SpecialGammaRows() {
     return {
         {"gamma, x to 33", 0.1, 33, 0, 0, QX_CALL(GammaFunction(a)),
@@ -101,6 +105,30 @@ std::vector<SpecialRow> SpecialGammaRows() {
          {},
          false,
          true},
+        {"normal tail, revision", -5, 5, 0, 0, QX_CALL(NormalValue(a, kSurvival)),
+         Of(QX_GSL(gsl_cdf_ugaussian_Q(a)), QX_CALL(0.5 * std::erfc(a / kRootTwo)),
+            QX_BOOST(boost::math::cdf(boost::math::complement(boost::math::normal(), a))))},
+        {"t tail, revision", -4, 4, 1, 50, QX_CALL(StudentValue(a, b, kSurvival)),
+         Of(QX_GSL(gsl_cdf_tdist_Q(a, b)), nullptr,
+            QX_BOOST(boost::math::cdf(boost::math::complement(boost::math::students_t(b), a))))},
+        {"F tail, d = 9, revision", 0.01, 5, 1, 50, QX_CALL(FisherValue(a, b, 9, kSurvival)),
+         Of(QX_GSL(gsl_cdf_fdist_Q(a, b, 9)), nullptr,
+            QX_BOOST(boost::math::cdf(boost::math::complement(boost::math::fisher_f(b, 9), a))))},
+        {"chi-square tail, revision", 0.1, 60, 1, 50, QX_CALL(ChiSquareValue(a, b, kSurvival)),
+         Of(QX_GSL(gsl_cdf_chisq_Q(a, b)), nullptr,
+            QX_BOOST(boost::math::cdf(boost::math::complement(boost::math::chi_squared(b), a))))},
+        {"normal quantile, revision", 0.001, 0.999, 0, 0, QX_CALL(NormalPoint(a, false)),
+         Of(QX_GSL(gsl_cdf_ugaussian_Pinv(a)), nullptr,
+            QX_BOOST(boost::math::quantile(boost::math::normal(), a)))},
+        {"t quantile, revision", 0.001, 0.999, 1, 50, QX_CALL(StudentPoint(a, false, b)),
+         Of(QX_GSL(gsl_cdf_tdist_Pinv(a, b)), nullptr,
+            QX_BOOST(boost::math::quantile(boost::math::students_t(b), a)))},
+        {"F quantile, d = 9, revision", 0.001, 0.999, 1, 50, QX_CALL(FisherPoint(a, false, b, 9)),
+         Of(QX_GSL(gsl_cdf_fdist_Pinv(a, b, 9)), nullptr,
+            QX_BOOST(boost::math::quantile(boost::math::fisher_f(b, 9), a)))},
+        {"chi-square quantile, revision", 0.001, 0.999, 1, 50, QX_CALL(ChiSquarePoint(a, false, b)),
+         Of(QX_GSL(gsl_cdf_chisq_Pinv(a, b)), nullptr,
+            QX_BOOST(boost::math::quantile(boost::math::chi_squared(b), a)))},
     };
 }
 

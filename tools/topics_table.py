@@ -58,6 +58,8 @@ OTHERS = (
     ("NumerIntegration_head", "calculus.integrate"), ("NumerIntegration2D_head", "calculus.integrate2"),
     ("NumerIntegration3D_head", "calculus.integrate3"), ("Integral*", "calculus.cumulative"),
     ("Derivative", "calculus.derivative"),
+    ("NormDist* InvNdist*", "stats.norm"), ("TDist* InvTdist*", "stats.t"), ("FDist* InvFDist*", "stats.f"),
+    ("ChiSquare* InvChiSquare*", "stats.chi2"),
     ("Anova1Way*", "stats.anova"), ("Anova2Way*", "stats.anova2"), ("ANOVA3Way*", "stats.anova3"),
     ("QX_Gamma", "special.gamma"), ("QX_Beta", "special.beta"), ("QX_Gauss", "special.hyp2f1"),
     ("QX_Elliptic1", "special.ellipk"), ("QX_Elliptic2", "special.ellipe"),

@@ -373,6 +373,38 @@ def InvChiSquare_head(p: float | ArrayLike, dof: int | ArrayLike) -> float | NDA
     """The quantile of the chi-square distribution, by bisection to an absolute 1e-4, from below; 0 and ..."""
 
 
+def NormDist2026_head(x: float | ArrayLike, what: int | ArrayLike) -> float | NDArray[Any]:
+    """A value of the standard normal distribution at *x, within 2 eps and down to the smallest ..."""
+
+
+def TDist2026_head(t: float | ArrayLike, dof: float | ArrayLike, what: int | ArrayLike) -> float | NDArray[Any]:
+    """As NormDist2026_head, of Student's distribution with *dof degrees of freedom, which need not be ..."""
+
+
+def FDist2026_head(f: float | ArrayLike, n: float | ArrayLike, d: float | ArrayLike, what: int | ArrayLike) -> float | NDArray[Any]:
+    """As TDist2026_head, of Fisher's distribution with *n and *d degrees of freedom: 0 for f below 0. ..."""
+
+
+def ChiSquare2026_head(x: float | ArrayLike, dof: float | ArrayLike, what: int | ArrayLike) -> float | NDArray[Any]:
+    """As TDist2026_head, of the chi-square distribution, by the incomplete gamma integral in the ..."""
+
+
+def InvNdist2026_head(p: float | ArrayLike, tail: int | ArrayLike) -> float | NDArray[Any]:
+    """The point below which, or above which, the standard normal distribution has the probability *p: ..."""
+
+
+def InvTdist2026_head(p: float | ArrayLike, tail: int | ArrayLike, dof: float | ArrayLike) -> float | NDArray[Any]:
+    """As InvNdist2026_head, of Student's distribution with *dof degrees of freedom, which need not be ..."""
+
+
+def InvFDist2026_head(p: float | ArrayLike, tail: int | ArrayLike, n: float | ArrayLike, d: float | ArrayLike) -> float | NDArray[Any]:
+    """As InvTdist2026_head, of Fisher's distribution; the lower end is 0, which is also the result for ..."""
+
+
+def InvChiSquare2026_head(p: float | ArrayLike, tail: int | ArrayLike, dof: float | ArrayLike) -> float | NDArray[Any]:
+    """As InvFDist2026_head, of the chi-square distribution with *dof degrees of freedom. The point ..."""
+
+
 def ReDZTH(in_: ArrayLike, S: int, N: int, start: int, size: int) -> tuple[NDArray[np.float64], NDArray[np.complex128]]:
     """A band of bins of a transform of length L = S N from S transforms of length N: out[i] = sum over ..."""
 

@@ -108,36 +108,62 @@ class Anova(Result):
 
 
 class Distribution:
-    """A distribution with its cumulative function and its quantiles; made by this module: `norm`, `t`, `chi2`
-    and `f`, with degrees of freedom as whole numbers behind the argument, as of `scipy.stats`.
+    """A distribution with its functions and its quantiles; made by this module: `norm`, `t`, `chi2` and `f`,
+    with degrees of freedom behind the argument, as of `scipy.stats`; they need not be whole.
+
+    Small probabilities keep their digits in either tail: take `sf` and `isf` for the upper one.
 
     Examples
     --------
     >>> import qx
     >>> qx.stats.chi2.cdf(3.841, 1).round(3)
     0.95
+    >>> float(qx.stats.norm.sf(20.0)), float(qx.stats.norm.isf(1e-300))
+    (2.7536241186062337e-89, 37.0470964099246)
     """
 
     def __init__(self, name: Any, parameters: Any) -> None:
         self.name, self.parameters = name, parameters
 
-    def _call(self, kind: Any, x: Any, dof: Any) -> Any:
+    def _degrees(self, dof: Any) -> Any:
         if len(dof) != len(self.parameters):
             refuse(f"stats.{self.name}", ", ".join(self.parameters) or "dof",
                    f"{len(self.parameters)} are needed; {len(dof)} came", "ErrTooFewForParameters")
-        return np.asarray(getattr(core, f"{self.name}_{kind}")(x, *dof))[()]
+        return dof
+
+    def _value(self, x: Any, dof: Any, what: int) -> Any:
+        return np.asarray(getattr(core, self.name)(x, *self._degrees(dof), what))[()]
+
+    def _point(self, p: Any, dof: Any, tail: int) -> Any:
+        return np.asarray(getattr(core, f"{self.name}_point")(p, tail, *self._degrees(dof)))[()]
 
     def cdf(self, x: Any, *dof: Any) -> Any:
         """The probability of a value of at most x."""
-        return self._call("cdf", x, dof)
+        return self._value(x, dof, 0)
 
     def sf(self, x: Any, *dof: Any) -> Any:
-        """The probability of a value above x, 1 - cdf."""
-        return 1 - self.cdf(x, *dof)
+        """The probability of a value above x."""
+        return self._value(x, dof, 1)
+
+    def logcdf(self, x: Any, *dof: Any) -> Any:
+        """The logarithm of `cdf`."""
+        return self._value(x, dof, 2)
+
+    def logsf(self, x: Any, *dof: Any) -> Any:
+        """The logarithm of `sf`."""
+        return self._value(x, dof, 3)
+
+    def pdf(self, x: Any, *dof: Any) -> Any:
+        """The density."""
+        return self._value(x, dof, 4)
 
     def ppf(self, p: Any, *dof: Any) -> Any:
         """The quantile: the value that is not exceeded with probability p."""
-        return self._call("ppf", p, dof)
+        return self._point(p, dof, 0)
+
+    def isf(self, p: Any, *dof: Any) -> Any:
+        """The value that is exceeded with probability p."""
+        return self._point(p, dof, 1)
 
     def __repr__(self) -> str:
         return f"Distribution {self.name}({', '.join(self.parameters)})"

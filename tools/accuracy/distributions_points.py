@@ -115,3 +115,104 @@ FUNCTIONS = [
              {"GSL": from_gsl("gsl_cdf_chisq_Pinv", "dd"),
               "SciPy": lambda p, dof: 2 * from_scipy("gammaincinv")(dof / 2, p)}, 1, note=BISECTION),
 ]
+
+
+# The revisions: tails and logarithms by series with positive terms, in as many digits as 1 - p needs.
+def far(function):
+    """A function of the arguments, in the digits that a complement of 1e-320 needs."""
+    def value(*arguments):
+        with mp.workdps(400):
+            return +function(*(mpf(a) for a in arguments))
+    return value
+
+
+def series(first, ratio):
+    total, term, k = first, first, 0
+    while term > total * mpf(10)**-(mp.dps - 5):
+        term *= ratio(k)
+        total += term
+        k += 1
+    return total
+
+
+def lower_beta(a, b, x, y):
+    if x > y:
+        return 1 - lower_beta(b, a, y, x)
+    slope = mpmath.exp(a * mpmath.log(x) + b * mpmath.log(y) + mpmath.loggamma(a + b) - mpmath.loggamma(a) -
+                       mpmath.loggamma(b))
+    return slope * series(1 / a, lambda k: x * (a + b + k) / (a + k + 1))
+
+
+def upper_chi_square(x, dof):
+    a, x = dof / 2, x / 2
+    slope = mpmath.exp(a * mpmath.log(x) - x - mpmath.loggamma(a))
+    return 1 - slope * series(1 / a, lambda k: x / (a + k + 1))
+
+
+def lower_fisher(f, n, d):
+    return lower_beta(n / 2, d / 2, n * f / (n * f + d), d / (n * f + d))
+
+
+def upper_student(t, dof):
+    return lower_beta(dof / 2, mpf(1) / 2, dof / (dof + t * t), t * t / (dof + t * t)) / 2
+
+
+SURVIVAL = 1
+REAL = [0.3, 1.0, 2.5, 7.0, 30.0, 400.0]
+
+
+def chosen(peer_function, *order):
+    """A peer without the last argument, which chooses the value."""
+    return peer_function and (lambda *a: peer_function(*[a[k] for k in order]))
+
+
+def minus_first(peer_function):
+    return peer_function and (lambda x, what: peer_function(-x))
+
+
+def with_choice(points, choice):
+    return [(*point, choice) for point in points]
+
+
+T_POINTS = product([0.001, 0.4, 2.0, 9.0, 60.0], REAL)
+F_POINTS = [(f, n, d) for f in (1e-9, 0.01, 0.4, 1.1, 3.0, 60.0) for n in REAL for d in (0.5, 4.0, 90.0)]
+CHI_POINTS = [(float(x * d), d) for d in REAL for x in (1e-3, 0.3, 0.9, 1.2, 2.0, 3.0)] + [(900.0, 3.0)]
+
+FUNCTIONS += [
+    Function("NormDist2026_head", "DIoe", far(lambda x, what: mpmath.erfc(x / mpmath.sqrt(2)) / 2),
+             [("survival, x in [-3, 38]", with_choice(single(linear(-3, 38)), SURVIVAL))],
+             {"GSL": chosen(from_gsl("gsl_cdf_ugaussian_Q", "d"), 0), "SciPy": minus_first(from_scipy("ndtr"))}),
+    Function("TDist2026_head", "DDIoe", far(lambda t, dof, what: upper_student(t, dof)),
+             [("survival, t in [0.001, 60], 0.3 to 400 degrees", with_choice(T_POINTS, SURVIVAL))],
+             {"GSL": chosen(from_gsl("gsl_cdf_tdist_Q", "dd"), 0, 1),
+              "SciPy": lambda t, dof, what: from_scipy("stdtr")(dof, -t)}),
+    Function("FDist2026_head", "DDDIoe", far(lambda f, n, d, what: 1 - lower_fisher(f, n, d)),
+             [("survival, f in [1e-9, 60], 0.3 to 400 degrees", with_choice(F_POINTS, SURVIVAL))],
+             {"GSL": chosen(from_gsl("gsl_cdf_fdist_Q", "ddd"), 0, 1, 2),
+              "SciPy": lambda f, n, d, what: from_scipy("fdtrc")(n, d, f)}),
+    Function("FDist2026_head", "DDDIoe", far(lambda f, n, d, what: lower_fisher(f, n, d)),
+             [("probability, f in [1e-9, 60], 0.3 to 400 degrees", with_choice(F_POINTS, 0))],
+             {"GSL": chosen(from_gsl("gsl_cdf_fdist_P", "ddd"), 0, 1, 2),
+              "SciPy": lambda f, n, d, what: from_scipy("fdtr")(n, d, f)}, title="FDist2026_head, probability"),
+    Function("ChiSquare2026_head", "DDIoe", far(lambda x, dof, what: upper_chi_square(x, dof)),
+             [("survival, x in [0.001, 3] dof, 0.3 to 400 degrees", with_choice(CHI_POINTS, SURVIVAL))],
+             {"GSL": chosen(from_gsl("gsl_cdf_chisq_Q", "dd"), 0, 1),
+              "SciPy": lambda x, dof, what: from_scipy("chdtrc")(dof, x)}),
+    # The inverses on the points of their elders, which give the lower tail.
+    Function("InvNdist2026_head", "DIoe", lambda p, tail: normal_quantile(p),
+             [("p in [1e-300, 0.5)", with_choice(single(logarithmic(1e-300, 0.49)), 0)),
+              ("p in [0.501, 1)", with_choice(single(linear(0.501, 1 - 1e-9)), 0))],
+             {"GSL": chosen(from_gsl("gsl_cdf_ugaussian_Pinv", "d"), 0), "SciPy": chosen(from_scipy("ndtri"), 0)}),
+    Function("InvTdist2026_head", "DIDoe", lambda p, tail, dof: student_quantile(p, dof),
+             [(t, [(p, 0, dof) for p, dof in q]) for t, q in rows("p in [1e-4, 0.999]", PROBABILITIES, DOFS[1:])],
+             {"GSL": chosen(from_gsl("gsl_cdf_tdist_Pinv", "dd"), 0, 2), "SciPy": chosen(from_scipy("stdtrit"), 2, 0)}),
+    Function("InvFDist2026_head", "DIDDoe", lambda p, tail, n, d: fisher_quantile(p, n, d),
+             [(t, [(p, 0, n, 9.0) for p, n in q]) for t, q in rows("p in [1e-4, 0.999]", PROBABILITIES)],
+             {"GSL": chosen(from_gsl("gsl_cdf_fdist_Pinv", "ddd"), 0, 2, 3),
+              "SciPy": chosen(from_scipy("fdtri"), 2, 3, 0)}),
+    Function("InvChiSquare2026_head", "DIDoe", lambda p, tail, dof: chi_square_quantile(p, dof),
+             [(t, [(p, 0, dof) for p, dof in q])
+              for t, q in rows("p in [1e-4, 0.999]", PROBABILITIES, DOFS, [1000, 3000])],
+             {"GSL": chosen(from_gsl("gsl_cdf_chisq_Pinv", "dd"), 0, 2),
+              "SciPy": lambda p, tail, dof: 2 * from_scipy("gammaincinv")(dof / 2, p)}),
+]

@@ -46,6 +46,56 @@ std::vector<Recipe> DistributionRecipes() {
                                   c.byReference(12), c.scalar(0), c.err());
          },
          None, sizes},
+        {"NormDist2026_head",
+         [](Call &c) {
+             return NormDist2026_head(c.byReference(Point(c)), c.byReference(c.n % 5), c.scalar(0),
+                                      c.err());
+         },
+         None, sizes},
+        {"TDist2026_head",
+         [](Call &c) {
+             return TDist2026_head(c.byReference(Point(c)), c.byReference(0.37 * c.n),
+                                   c.byReference(c.n % 5), c.scalar(0), c.err());
+         },
+         None, sizes},
+        {"FDist2026_head",
+         [](Call &c) {
+             return FDist2026_head(c.byReference(Point(c) + 3.1), c.byReference(0.37 * c.n),
+                                   c.byReference(7.5), c.byReference(c.n % 5), c.scalar(0),
+                                   c.err());
+         },
+         None, sizes},
+        {"ChiSquare2026_head",
+         [](Call &c) {
+             return ChiSquare2026_head(c.byReference(0.9 * c.n), c.byReference(1.1 * c.n),
+                                       c.byReference(c.n % 5), c.scalar(0), c.err());
+         },
+         None, sizes},
+        {"InvNdist2026_head",
+         [](Call &c) {
+             return InvNdist2026_head(c.byReference(Probability(c)), c.byReference(c.n % 2),
+                                      c.scalar(0), c.err());
+         },
+         None, sizes},
+        {"InvTdist2026_head",
+         [](Call &c) {
+             return InvTdist2026_head(c.byReference(Probability(c)), c.byReference(c.n % 2),
+                                      c.byReference(0.37 * c.n), c.scalar(0), c.err());
+         },
+         None, sizes},
+        {"InvFDist2026_head",
+         [](Call &c) {
+             return InvFDist2026_head(c.byReference(Probability(c)), c.byReference(c.n % 2),
+                                      c.byReference(0.37 * c.n), c.byReference(12.5), c.scalar(0),
+                                      c.err());
+         },
+         None, sizes},
+        {"InvChiSquare2026_head",
+         [](Call &c) {
+             return InvChiSquare2026_head(c.byReference(Probability(c)), c.byReference(c.n % 2),
+                                          c.byReference(0.37 * c.n), c.scalar(0), c.err());
+         },
+         None, sizes},
         {"InvChiSquare_head",
          [](Call &c) {
              return InvChiSquare_head(c.byReference(Probability(c)), c.byReference(c.n),

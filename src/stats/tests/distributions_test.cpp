@@ -8,6 +8,8 @@
 #include <bit>
 #include <cmath>
 #include <limits>
+#include <string>
+#include <vector>
 
 namespace {
 
@@ -18,6 +20,29 @@ struct Outcome {
     double value;
     ErrorCode err;
 };
+
+// The revisions, of any distribution: `parameters` are the degrees, `choice` the value or the tail.
+double Revised(const std::string &name, const std::vector<double> &arguments, int32_t choice,
+               ErrorCode code = 0) {
+    Outcome outcome = {7, 7};
+    const double *a = arguments.data();
+    DBL *value = &outcome.value;
+    ErrorCode *err = &outcome.err;
+    const auto call = [&]() {
+        return name == "norm"    ? NormDist2026_head(a, &choice, value, err)
+               : name == "t"     ? TDist2026_head(a, a + 1, &choice, value, err)
+               : name == "f"     ? FDist2026_head(a, a + 1, a + 2, &choice, value, err)
+               : name == "chi2"  ? ChiSquare2026_head(a, a + 1, &choice, value, err)
+               : name == "inorm" ? InvNdist2026_head(a, &choice, value, err)
+               : name == "it"    ? InvTdist2026_head(a, &choice, a + 1, value, err)
+               : name == "if"    ? InvFDist2026_head(a, &choice, a + 1, a + 2, value, err)
+                                 : InvChiSquare2026_head(a, &choice, a + 1, value, err);
+    };
+    EXPECT_EQ(call(), 0);
+    EXPECT_EQ(outcome.err, code) << name;
+    EXPECT_EQ(code != 0, std::bit_cast<uint64_t>(outcome.value) == 0x7FF8000000000000U);
+    return outcome.value;
+}
 
 typedef int32_t (*OneDof)(const DBL *, const int32_t *, DBL *, ErrorCode *);
 typedef int32_t (*TwoDofs)(const DBL *, const int32_t *, const int32_t *, DBL *, ErrorCode *);
@@ -158,6 +183,115 @@ TEST(Distributions, EdgesAndCodes) {
     expectLowerEnd(Call(InvTdist_head, nan, 3), -10000.0);
     expectLowerEnd(Call(InvFDist_head, nan, 3, 4), 1e-6);
     expectLowerEnd(Call(InvChiSquare_head, nan, 3), 0.0);
+}
+
+constexpr double eps = std::numeric_limits<double>::epsilon();
+
+struct TailRow {
+    std::string distribution, what;
+    std::vector<double> arguments;
+    double value;
+    std::string text;
+};
+
+std::vector<TailRow> TailRows() {
+    std::vector<TailRow> rows;
+    for (const auto &row : qx::test::ReadTable(qx::test::TestData("distribution_tails.dat"))) {
+        const auto cut = row.name.find('_');
+        rows.push_back({row.name.substr(0, cut), row.name.substr(cut + 1), row.arguments, row.value,
+                        row.text});
+    }
+    return rows;
+}
+
+TEST(DistributionTails, AgreeWithMultiplePrecision) {
+    const auto rows = TailRows();
+    ASSERT_GT(rows.size(), 700U);
+    const std::vector<std::string> kinds = {"cdf", "sf", "logcdf", "logsf", "pdf"};
+    for (const auto &row : rows)
+        for (int32_t what = 0; what < 5; ++what)
+            if (row.what == kinds[static_cast<std::size_t>(what)]) {
+                EXPECT_NEAR(Revised(row.distribution, row.arguments, what), row.value,
+                            4 * eps * std::fabs(row.value) + 2 * 0x1p-1074)
+                    << row.text;
+            }
+}
+
+// Back from the tail's value to the argument, where a value's rounding does not count for more.
+TEST(DistributionTails, InversesReturnTheArgument) {
+    int checked = 0;
+    for (const auto &row : TailRows()) {
+        const bool isUpper = row.what == "sf";
+        const double x = row.arguments[0];
+        if ((row.what != "cdf" && !isUpper) || row.value > 0.5 || row.value < 1e-300 || x == 0)
+            continue;
+        const double slope = std::fabs(x) * Revised(row.distribution, row.arguments, 4);
+        std::vector<double> arguments = row.arguments;
+        arguments[0] = row.value;
+        const double back = Revised("i" + row.distribution, arguments, isUpper);
+        EXPECT_NEAR(back, x, (4 + row.value / slope) * eps * std::fabs(x)) << row.text;
+        ++checked;
+    }
+    EXPECT_GT(checked, 90);
+}
+
+TEST(DistributionTails, ReachLimitsOfTheDegrees) {
+    for (const double t : {-30.0, -1.0, 0.25, 8.0})
+        for (const int32_t what : {0, 1, 2, 3, 4}) {
+            const double limit = Revised("norm", {t}, what);
+            EXPECT_NEAR(Revised("t", {t, inf}, what), limit, 4 * eps * std::fabs(limit));
+        }
+    for (const double x : {0.5, 3.0, 40.0}) {
+        const double limit = Revised("chi2", {x, 3.5}, 1);
+        EXPECT_NEAR(Revised("f", {x / 3.5, 3.5, inf}, 1), limit, 60 * eps * limit)
+            << "x / 3.5 is rounded";
+    }
+    // Cauchy's distribution, far out: 1 / (pi t), and beyond the range.
+    EXPECT_NEAR(Revised("t", {1e200, 1.0}, 1), 1e-200 / M_PI, 4e-200 * eps);
+    EXPECT_NEAR(Revised("it", {1e-200, 1.0}, 1), 1e200 / M_PI, 4e200 * eps);
+    EXPECT_EQ(Revised("it", {1e-300, 0.5}, 1), inf);
+    EXPECT_EQ(Revised("ichi2", {1e-300, 0.01}, 0), 0);
+    // The quarter of a large number of degrees at the mean of the distribution.
+    EXPECT_NEAR(Revised("chi2", {1e10, 1e10}, 0), 0.5 + 1 / (3 * std::sqrt(M_PI * 1e10)), 1e-14);
+}
+
+TEST(DistributionTails, EdgesAndCodes) {
+    for (const std::string name : {"norm", "t", "f", "chi2"}) {
+        std::vector<double> a = {inf, 3.0, 5.0};
+        EXPECT_EQ(Revised(name, a, 0), 1);
+        EXPECT_EQ(Revised(name, a, 1), 0);
+        EXPECT_EQ(Revised(name, a, 2), 0);
+        EXPECT_EQ(Revised(name, a, 3), -inf);
+        EXPECT_EQ(Revised(name, a, 4), 0);
+        a[0] = -inf;
+        EXPECT_EQ(Revised(name, a, 0), 0);
+        EXPECT_EQ(Revised(name, a, 1), 1);
+        a[0] = nan;
+        Revised(name, a, 4, ErrNaNInData);
+        Revised(name, a, 5, ErrInvalidSelector);
+        Revised(name, a, -1, ErrInvalidSelector);
+        a = {0.25, 3.0, 5.0};
+        const std::string inverse = "i" + name;
+        Revised(inverse, a, 2, ErrInvalidSelector);
+        for (const double p : {-0.1, 1.1, nan})
+            Revised(inverse, {p, 3.0, 5.0}, 1, ErrProbabilityOutOfRange);
+        EXPECT_EQ(Revised(inverse, {1.0, 3.0, 5.0}, 0), inf);
+        EXPECT_EQ(Revised(inverse, {0.0, 3.0, 5.0}, 1), inf);
+        EXPECT_EQ(Revised(inverse, {1.0, 3.0, 5.0}, 1), Revised(inverse, {0.0, 3.0, 5.0}, 0));
+        if (name == "norm")
+            continue;
+        for (const double degrees : {0.0, -1.0, nan}) {
+            Revised(name, {nan, degrees, 5.0}, 0, ErrTooFewForParameters);
+            Revised(inverse, {2.0, degrees, 5.0}, 0, ErrTooFewForParameters);
+        }
+    }
+    Revised("f", {1.0, 5.0, 0.0}, 0, ErrTooFewForParameters);
+    EXPECT_EQ(Revised("inorm", {0.5}, 0), 0);
+    EXPECT_EQ(Revised("it", {0.5, 3.0}, 1), 0);
+    EXPECT_EQ(Revised("chi2", {0.0, 1.0}, 4), inf);
+    EXPECT_EQ(Revised("chi2", {0.0, 2.0}, 4), 0.5);
+    EXPECT_EQ(Revised("f", {0.0, 2.0, 3.0}, 4), 1);
+    EXPECT_EQ(Revised("f", {0.0, 3.0, 3.0}, 4), 0);
 }
 
 } // namespace
