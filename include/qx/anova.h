@@ -12,11 +12,20 @@ QX_BEGIN_DECLS
 
 /** Pearson's chi-square test of independence on a table of counts: the statistic, the sum of (O -
     E)^2 / E with E = column sum times row sum / total, and the probability of a larger one with
-    (rows - 1)(columns - 1) degrees of freedom. An empty row or column gives NaN with code 0.
+    (rows - 1)(columns - 1) degrees of freedom. An empty row or column gives NaN with code 0. p is 1
+    less the lower tail: below 1e-16 no digit is left; Contingency2026_head has them all.
     Codes: ErrTableNegativeSize (a dimension is negative), ErrTableTooSmall (fewer than 2 rows or
     columns), ErrOutOfMemory (no scratch memory), ErrTableNegativeSize (a count is negative). */
 QX_API int32_t Contingency_head(QX_IN I32_2D table, QX_OUT DBL *chiSquare, QX_OUT DBL *p,
                                 QX_OUT ErrorCode *err);
+
+/** As Contingency_head, with both numbers to the last digits: the statistic from exact O total - (row
+    sum)(column sum), and p from the upper tail itself, down to the smallest numbers. An empty row or
+    column gives NaN with code 0.
+    Codes: ErrTableNegativeSize (a dimension is negative), ErrTableTooSmall (fewer than 2 rows or
+    columns), ErrOutOfMemory (no scratch memory), ErrTableNegativeSize (a count is negative). */
+QX_API int32_t Contingency2026_head(QX_IN I32_2D table, QX_OUT DBL *chiSquare, QX_OUT DBL *p,
+                                    QX_OUT ErrorCode *err);
 
 /** One-way analysis of variance of y, whose element i belongs to the level labels[i], on *k levels:
     sums and means of squares between levels and within them (error), their ratio f and the
@@ -36,13 +45,30 @@ QX_API int32_t Anova1Way_head(QX_IN DBL1D y, QX_IN I32_1D labels, QX_IN const in
                               QX_OUT DBL *ssTotal, QX_OUT ErrorCode *err);
 
 /** As Anova1Way_head, with the value that f exceeds with probability alpha, by bisection to 1e-4,
-    infinite for an alpha of 0 and up to 5.5e-17, where 1 - alpha is 1.
+    infinite for an alpha of 0 and up to 5.5e-17, where 1 - alpha is 1. With a mean of 1e6 standard
+    deviations less than one digit of the sums is left, p below 1e-16 has none; Anova1Way_head_2026
+    keeps them.
     Codes: ErrSizeMismatch (the lengths differ), ErrEmptyInput (y is empty), ErrAnovaFewLevels (k is
     below 2 or not below the number of observations), ErrBadSignificance (alpha lies outside [0,
     1]), ErrOutOfMemory (no scratch memory), ErrAnovaFactorEmpty (more labels than k),
     ErrAnovaNoReplication (fewer), ErrNaNInData (f is NaN).
     NaN: y refused with ErrNaNInData; alpha in no result. */
 QX_API int32_t Anova1Way_head_2017(QX_IN DBL1D y, QX_IN I32_1D labels, QX_IN const int32_t *k,
+                                   double alpha, QX_OUT DBL *ssBetween, QX_OUT DBL *msBetween,
+                                   QX_OUT DBL *f, QX_OUT DBL *p, QX_OUT DBL *ssError,
+                                   QX_OUT DBL *msError, QX_OUT DBL *ssTotal, QX_OUT DBL *fCritical,
+                                   QX_OUT ErrorCode *err);
+
+/** As Anova1Way_head_2017, by two passes over the exact differences to one observation, in twice the
+    precision: the sums of squares are the exact ones rounded, and a sum that is 0 in truth is 0. The
+    data are scaled by a power of 2, so that squares overflow only where the result does. p is the
+    upper tail itself, fCritical its inverse to the last digits, infinite for an alpha of 0.
+    Codes: ErrSizeMismatch (the lengths differ), ErrEmptyInput (y is empty), ErrAnovaFewLevels (k is
+    below 2 or not below the number of observations), ErrBadSignificance (alpha lies outside [0, 1]
+    or is NaN), ErrOutOfMemory (no scratch memory), ErrAnovaFactorEmpty (more labels than k),
+    ErrAnovaNoReplication (fewer), ErrNaNInData (f is NaN: all values are equal, or not all are
+    finite). */
+QX_API int32_t Anova1Way_head_2026(QX_IN DBL1D y, QX_IN I32_1D labels, QX_IN const int32_t *k,
                                    double alpha, QX_OUT DBL *ssBetween, QX_OUT DBL *msBetween,
                                    QX_OUT DBL *f, QX_OUT DBL *p, QX_OUT DBL *ssError,
                                    QX_OUT DBL *msError, QX_OUT DBL *ssTotal, QX_OUT DBL *fCritical,

@@ -1,9 +1,14 @@
 #include "stats/anova.h"
 
+#include "frame/constants.h"
+#include "frame/extended.h"
 #include "frame/scratch.h"
 #include "stats/distributions.h"
 #include "stats/levels.h"
+#include "stats/tail_distributions.h"
 
+#include <algorithm>
+#include <cmath>
 #include <cstddef>
 
 namespace qx {
@@ -102,6 +107,156 @@ ErrorCode OneWayAnova(ConstRealVector y, ConstVectorView<ElementType::I32> label
     if (status == 0)
         status = FisherQuantile(1.0 - alpha, k - 1, n - k, &result->fCritical);
     return Merge(status, levels.release());
+}
+
+ErrorCode ContingencyTail(const ConstMatrixView<ElementType::I32> &table, DBL *chiSquare, DBL *p) {
+    const int32_t rows = table.rows(), cols = table.cols();
+    if (rows < 2 || cols < 2)
+        return ErrTableTooSmall;
+    Scratch<ElementType::DBL> sums;
+    if (const ErrorCode status = sums.allocate(int64_t{rows} + cols))
+        return status;
+    DBL *rowSum = sums.data();
+    DBL *colSum = sums.data() + rows;
+    Fill(rowSum, std::ptrdiff_t{rows} + cols, 0.0);
+    double total = 0.0;
+    for (int32_t i = 0; i < rows; ++i)
+        for (int32_t j = 0; j < cols; ++j) {
+            const int32_t cell = table(i, j);
+            if (cell < 0)
+                return ErrTableNegativeSize;
+            rowSum[i] += cell;
+            colSum[j] += cell;
+            total += cell;
+        }
+
+    Extended statistic = {0.0, 0.0};
+    for (int32_t i = 0; i < rows; ++i)
+        for (int32_t j = 0; j < cols; ++j) {
+            const int32_t cell = table(i, j);
+            const Extended product = ExactProduct(rowSum[i], colSum[j]);
+            const Extended difference = ExactProduct(cell, total) - product;
+            statistic = statistic + difference * difference / product;
+        }
+    statistic = statistic / Extended{total, 0.0};
+    *chiSquare = statistic.high;
+    // An empty row or column makes the statistic NaN, which has no tail.
+    const double dof = static_cast<double>(rows - 1) * (cols - 1);
+    *p = std::isnan(*chiSquare) ? kNaN
+                                : ChiSquareValue(*chiSquare, dof, DistributionValue::Survival);
+    return sums.release();
+}
+
+namespace {
+
+// y[i] - y[0] times a power of 2, with which no square overflows or vanishes.
+class ScaledDifferences {
+public:
+    explicit ScaledDifferences(ConstRealVector y) : y_(y) {
+        double largest = 0.0;
+        for (const DBL &value : y)
+            largest = std::max(largest, std::fabs(value));
+        if (largest > 0.0 && std::isfinite(largest))
+            exponent_ = std::ilogb(largest);
+    }
+    Extended at(int32_t i) const { return ExactSum(scaled(i), -scaled(0)); }
+    double unscaledSquare(double square) const {
+        return std::ldexp(std::ldexp(square, exponent_), exponent_);
+    }
+
+private:
+    double scaled(int32_t i) const { return std::ldexp(y_[i], -exponent_); }
+
+    ConstRealVector y_;
+    int exponent_ = 0;
+};
+
+struct SumsOfSquares {
+    Extended between, error;
+};
+
+// `sums` has a pair of elements for each level, the parts of its sum and then of its mean.
+SumsOfSquares SquaresAboutMeans(const ScaledDifferences &differences,
+                                ConstVectorView<ElementType::I32> labels, Levels &levels,
+                                Scratch<ElementType::DBL> &sums) {
+    const auto n = static_cast<int32_t>(labels.size());
+    const auto pair = [&](std::ptrdiff_t i) { return Extended{sums[2 * i], sums[2 * i + 1]}; };
+    const auto put = [&](std::ptrdiff_t i, Extended value) {
+        sums[2 * i] = value.high;
+        sums[2 * i + 1] = value.low;
+    };
+    Extended total = {0.0, 0.0};
+    for (int32_t i = 0; i < n; ++i) {
+        const int32_t level = levels.placeOf(labels[i]);
+        const Extended difference = differences.at(i);
+        put(level, pair(level) + difference);
+        total = total + difference;
+    }
+    const Extended mean = total / Extended{static_cast<double>(n), 0.0};
+    SumsOfSquares squares = {};
+    for (int32_t i = 0; i < levels.count(); ++i) {
+        const Extended count = {static_cast<double>(levels.at(i).count), 0.0};
+        put(i, pair(i) / count);
+        const Extended effect = pair(i) - mean;
+        squares.between = squares.between + count * (effect * effect);
+    }
+    Extended all = {0.0, 0.0};
+    for (int32_t i = 0; i < n; ++i) {
+        const Extended difference = differences.at(i);
+        const Extended rest = difference - pair(levels.placeOf(labels[i]));
+        squares.error = squares.error + rest * rest;
+        all = all + difference * difference;
+    }
+    constexpr double negligible = 0x1p-90;
+    for (Extended *sum : {&squares.between, &squares.error})
+        if (sum->high < negligible * all.high)
+            *sum = {0.0, 0.0};
+    return squares;
+}
+
+} // namespace
+
+ErrorCode OneWayAnovaByDifferences(ConstRealVector y, ConstVectorView<ElementType::I32> labels,
+                                   int32_t k, double alpha, OneWayTable *result) {
+    const auto n = static_cast<int32_t>(y.size());
+    if (k < 2 || k >= n)
+        return ErrAnovaFewLevels;
+    if (!(alpha >= 0.0 && alpha <= 1.0))
+        return ErrBadSignificance;
+    Levels levels;
+    if (const ErrorCode status = levels.reserve(k))
+        return status;
+    Scratch<ElementType::DBL> sums;
+    if (const ErrorCode status = sums.allocate(2 * int64_t{k}))
+        return status;
+    Fill(sums.data(), 2 * std::ptrdiff_t{k}, 0.0);
+    for (int32_t i = 0; i < n; ++i) {
+        Level *level = levels.find(labels[i]);
+        if (level == nullptr)
+            return ErrAnovaFactorEmpty;
+        ++level->count;
+    }
+    if (levels.count() < k)
+        return ErrAnovaNoReplication;
+
+    const ScaledDifferences differences(y);
+    const SumsOfSquares squares = SquaresAboutMeans(differences, labels, levels, sums);
+    const Extended whole = squares.between + squares.error;
+    const double between = squares.between.high / (k - 1);
+    const double error = squares.error.high / (n - k);
+    result->ssBetween = differences.unscaledSquare(squares.between.high);
+    result->ssError = differences.unscaledSquare(squares.error.high);
+    result->ssTotal = differences.unscaledSquare(whole.high);
+    result->msBetween = differences.unscaledSquare(between);
+    result->msError = differences.unscaledSquare(error);
+    const Extended ratio = squares.between / squares.error * Extended{double(n - k), 0.0} /
+                           Extended{double(k - 1), 0.0};
+    result->f = squares.error.high > 0.0 ? ratio.high : between / error;
+    if (std::isnan(result->f))
+        return ErrNaNInData;
+    result->p = FisherValue(result->f, k - 1, n - k, DistributionValue::Survival);
+    result->fCritical = FisherPoint(alpha, true, k - 1, n - k);
+    return Merge(levels.release(), sums.release());
 }
 
 } // namespace qx

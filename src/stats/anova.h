@@ -23,6 +23,16 @@ struct OneWayTable {
 ErrorCode OneWayAnova(ConstRealVector y, ConstVectorView<ElementType::I32> labels, int32_t k,
                       double alpha, OneWayTable *result);
 
+// The revisions. The statistic from exact O total - (row sum)(column sum), in twice the precision, and
+// its probability from the upper tail.
+ErrorCode ContingencyTail(const ConstMatrixView<ElementType::I32> &table, DBL *chiSquare, DBL *p);
+
+// Two passes over differences to one observation, of data scaled by a power of 2, in twice the
+// precision: the sums of squares are the exact ones rounded. One below 2^-90 of the sum of squares
+// of the differences is taken as 0, which it is in truth.
+ErrorCode OneWayAnovaByDifferences(ConstRealVector y, ConstVectorView<ElementType::I32> labels,
+                                   int32_t k, double alpha, OneWayTable *result);
+
 } // namespace qx
 
 #endif

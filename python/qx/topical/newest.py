@@ -183,7 +183,7 @@ NEWEST = {
         "mean": "Mean_head", "rms": "RMS_head", "rms_complex": "CxRMS_head",
         "moment": "Moment_head", "median": "Median_head", "mode": "ModeH", "mse": "MSE_head",
         "histogram": "histgran_head", "histogram_intervals": "GenHistH",
-        "contingency": "Contingency_head", "anova": "Anova1Way_head_2017", "anova2": "Anova2Way_head_2017",
+        "contingency": "Contingency2026_head", "anova": "Anova1Way_head_2026", "anova2": "Anova2Way_head_2017",
         "anova3": "ANOVA3Way_head_2017", "norm": "NormDist2026_head", "norm_point": "InvNdist2026_head",
         "t": "TDist2026_head", "t_point": "InvTdist2026_head", "chi2": "ChiSquare2026_head",
         "chi2_point": "InvChiSquare2026_head", "f": "FDist2026_head", "f_point": "InvFDist2026_head",

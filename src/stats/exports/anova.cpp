@@ -9,12 +9,14 @@
 namespace qx {
 namespace {
 
+template <auto Test>
 ErrorCode Contingency(In<I32_2D> table, OutDBL chiSquare, OutDBL p) {
     if (table.hasNegativeSize())
         return ErrTableNegativeSize;
-    return ContingencyTest(table.view(), chiSquare.address(), p.address());
+    return Test(table.view(), chiSquare.address(), p.address());
 }
 
+template <auto Analysis>
 ErrorCode OneWay(In<DBL1D> y, In<I32_1D> labels, int32_t k, double alpha, OutDBL ssBetween,
                  OutDBL msBetween, OutDBL f, OutDBL p, OutDBL ssError, OutDBL msError,
                  OutDBL ssTotal, OutDBL fCritical) {
@@ -22,7 +24,7 @@ ErrorCode OneWay(In<DBL1D> y, In<I32_1D> labels, int32_t k, double alpha, OutDBL
             {{y.size() != labels.size(), ErrSizeMismatch}, {y.isEmpty(), ErrEmptyInput}}))
         return failed;
     OneWayTable table = {};
-    const ErrorCode status = OneWayAnova(y.view(), labels.view(), k, alpha, &table);
+    const ErrorCode status = Analysis(y.view(), labels.view(), k, alpha, &table);
     ssBetween = table.ssBetween;
     msBetween = table.msBetween;
     f = table.f;
@@ -134,7 +136,11 @@ using qx::InErr;
 using qx::Returned;
 
 int32_t Contingency_head(I32_2D table, DBL *chiSquare, DBL *p, ErrorCode *err) {
-    return InErr(err, qx::Contingency, table, chiSquare, p);
+    return InErr(err, qx::Contingency<qx::ContingencyTest>, table, chiSquare, p);
+}
+
+int32_t Contingency2026_head(I32_2D table, DBL *chiSquare, DBL *p, ErrorCode *err) {
+    return InErr(err, qx::Contingency<qx::ContingencyTail>, table, chiSquare, p);
 }
 
 int32_t Anova1Way_head(DBL1D y, I32_1D labels, const int32_t *k, DBL *ssBetween, DBL *msBetween,
@@ -147,8 +153,15 @@ int32_t Anova1Way_head(DBL1D y, I32_1D labels, const int32_t *k, DBL *ssBetween,
 int32_t Anova1Way_head_2017(DBL1D y, I32_1D labels, const int32_t *k, double alpha, DBL *ssBetween,
                             DBL *msBetween, DBL *f, DBL *p, DBL *ssError, DBL *msError,
                             DBL *ssTotal, DBL *fCritical, ErrorCode *err) {
-    return InErr(err, qx::OneWay, y, labels, *k, alpha, ssBetween, msBetween, f, p, ssError,
-                 msError, ssTotal, fCritical);
+    return InErr(err, qx::OneWay<qx::OneWayAnova>, y, labels, *k, alpha, ssBetween, msBetween, f, p,
+                 ssError, msError, ssTotal, fCritical);
+}
+
+int32_t Anova1Way_head_2026(DBL1D y, I32_1D labels, const int32_t *k, double alpha, DBL *ssBetween,
+                            DBL *msBetween, DBL *f, DBL *p, DBL *ssError, DBL *msError,
+                            DBL *ssTotal, DBL *fCritical, ErrorCode *err) {
+    return InErr(err, qx::OneWay<qx::OneWayAnovaByDifferences>, y, labels, *k, alpha, ssBetween,
+                 msBetween, f, p, ssError, msError, ssTotal, fCritical);
 }
 
 ErrorCode Anova2Way_head(DBL1D y, I32_1D labelsA, I32_1D labelsB, int32_t levelsA, int32_t levelsB,

@@ -88,6 +88,22 @@ std::vector<Recipe> AnovaRecipes() {
          },
          None,
          {8, 50, 1000}},
+        {"Contingency2026_head",
+         [](Call &c) {
+             return Contingency2026_head(c.in2D<I32>(0, c.n, c.n + 1, Counts), c.scalar(0),
+                                         c.scalar(1), c.err());
+         },
+         None,
+         {2, 3, 50}},
+        {"Anova1Way_head_2026",
+         [](Call &c) {
+             return Anova1Way_head_2026(c.in<DBL>(0), c.in<I32>(1, c.n, ThreeLabels),
+                                        c.byReference(3), 0.05, c.scalar(0), c.scalar(1),
+                                        c.scalar(2), c.scalar(3), c.scalar(4), c.scalar(5),
+                                        c.scalar(6), c.scalar(7), c.err());
+         },
+         None,
+         {8, 50, 1000}},
         {"Anova1Way_head_2017",
          [](Call &c) {
              return Anova1Way_head_2017(c.in<DBL>(0), c.in<I32>(1, c.n, ThreeLabels),

@@ -26,13 +26,12 @@ struct Anova {
 };
 
 Anova AnovaOf(const std::vector<double> &values, const std::vector<int32_t> &labels, int32_t k,
-              double alpha) {
+              double alpha, decltype(&Anova1Way_head_2017) analysis = Anova1Way_head_2017) {
     const DBLArray y(values);
     const I32Array levels(labels);
     Anova a = {7, 7, 7, 7, 7, 7, 7, 7, 7};
-    EXPECT_EQ(Anova1Way_head_2017(y.handle(), levels.handle(), &k, alpha, &a.ssBetween,
-                                  &a.msBetween, &a.f, &a.p, &a.ssError, &a.msError, &a.ssTotal,
-                                  &a.fCritical, &a.err),
+    EXPECT_EQ(analysis(y.handle(), levels.handle(), &k, alpha, &a.ssBetween, &a.msBetween, &a.f,
+                       &a.p, &a.ssError, &a.msError, &a.ssTotal, &a.fCritical, &a.err),
               0);
     return a;
 }
@@ -60,6 +59,12 @@ TEST(Anova, ReachesTheDigitsThatASinglePassCanKeep) {
         const Anova a = AnovaOf(y, labels, k, 0.05);
         EXPECT_EQ(a.err, 0);
         ++sets;
+        // What rounding the data themselves to doubles leaves.
+        const Anova revised = AnovaOf(y, labels, k, 0.05, Anova1Way_head_2026);
+        const double kept = name == "SmLs07" ? 1e-2 : name == "SmLs04" ? 1e-9 : 1e-12;
+        EXPECT_NEAR(revised.ssBetween / ssBetween, 1.0, kept);
+        EXPECT_NEAR(revised.ssError / ssError, 1.0, kept);
+        EXPECT_NEAR(revised.f / f, 1.0, kept);
         if (name == "SmLs07") {
             EXPECT_GT(std::fabs(a.ssError / ssError - 1.0), 1e3) << "no digit is left here";
             continue;
@@ -70,6 +75,47 @@ TEST(Anova, ReachesTheDigitsThatASinglePassCanKeep) {
         EXPECT_NEAR(a.f / f, 1.0, bound);
     }
     EXPECT_EQ(sets, 5);
+}
+
+// Integers on a large constant, of which all sums are known exactly: 3, 5 and 4 observations with means
+// 2, 5 and 9.
+TEST(Anova, TheRevisionKeepsEveryDigitFarFromZero) {
+    const std::vector<double> plain{1, 2, 3, 3, 4, 5, 6, 7, 6, 8, 10, 12};
+    const std::vector<int32_t> labels{1, 1, 1, 2, 2, 2, 2, 2, 3, 3, 3, 3};
+    // Within: 2 + 10 + 20; between: sum of squares 493 less the above less 67^2 / 12.
+    const double within = 32.0;
+    const double between = 493.0 - within - 67.0 * 67.0 / 12.0;
+    const double eps = std::numeric_limits<double>::epsilon();
+    for (const double constant : {0.0, 1e9, 4e15, -4e15})
+        for (const double unit : {1.0, 0x1p-700, 0x1p500}) {
+            std::vector<double> y;
+            for (const double value : plain)
+                y.push_back((value + constant) * unit);
+            const Anova a = AnovaOf(y, labels, 3, 0.05, Anova1Way_head_2026);
+            const double f = between / 2 / (within / 9);
+            EXPECT_EQ(a.err, 0);
+            EXPECT_NEAR(a.f, f, 2 * eps * f);
+            EXPECT_NEAR(a.ssError, within * unit * unit, 0.0);
+            EXPECT_NEAR(a.ssBetween, between * unit * unit, 2 * eps * between * unit * unit);
+            EXPECT_NEAR(a.ssTotal, (between + within) * unit * unit, 80 * eps * unit * unit);
+            // With 2 and d degrees of freedom P(F > f) is (1 + 2 f / d)^(-d / 2).
+            const double p = std::pow(1 + 2 * f / 9, -4.5);
+            EXPECT_NEAR(a.p, p, 20 * eps * p);
+            EXPECT_NEAR(a.fCritical, 4.5 * (std::pow(0.05, -1 / 4.5) - 1), 40 * eps);
+        }
+
+    const Anova noError = AnovaOf({0.1, 0.1, 0.7, 0.7}, {0, 0, 1, 1}, 2, 0.05, Anova1Way_head_2026);
+    EXPECT_EQ(noError.err, 0);
+    EXPECT_EQ(noError.ssError, 0);
+    EXPECT_EQ(noError.f, std::numeric_limits<double>::infinity());
+    EXPECT_EQ(noError.p, 0);
+    const Anova noEffect =
+        AnovaOf({0.1, 0.3, 0.3, 0.1}, {0, 0, 1, 1}, 2, 0.05, Anova1Way_head_2026);
+    EXPECT_EQ(noEffect.ssBetween, 0);
+    EXPECT_EQ(noEffect.p, 1);
+    for (const double value : {0.1, std::numeric_limits<double>::infinity()})
+        EXPECT_EQ(AnovaOf({value, value, value}, {0, 0, 1}, 2, 0.05, Anova1Way_head_2026).err,
+                  ErrNaNInData);
 }
 
 // Three fertilisers of a textbook layout, worked by hand: means 5, 9, 10 over 6 plots each.
@@ -454,12 +500,13 @@ struct Contingency {
     ErrorCode err;
 };
 
-Contingency ContingencyOf(int32_t rows, int32_t cols, const std::vector<int32_t> &cells) {
+Contingency ContingencyOf(int32_t rows, int32_t cols, const std::vector<int32_t> &cells,
+                          decltype(&Contingency_head) test = Contingency_head) {
     const qx::test::Array2D<ElementType::I32> table(rows, cols);
     for (std::size_t i = 0; i < cells.size(); ++i)
         table.data()[i] = cells[i];
     Contingency c = {7, 7, 7};
-    EXPECT_EQ(Contingency_head(table.handle(), &c.chiSquare, &c.p, &c.err), 0);
+    EXPECT_EQ(test(table.handle(), &c.chiSquare, &c.p, &c.err), 0);
     return c;
 }
 
@@ -499,6 +546,32 @@ TEST(Contingency, FaultsAndEmptyRows) {
     const Contingency emptyRow = ContingencyOf(2, 2, {0, 0, 3, 4});
     EXPECT_EQ(emptyRow.err, 0);
     EXPECT_TRUE(std::isnan(emptyRow.chiSquare) && std::isnan(emptyRow.p));
+}
+
+// Two by two with one degree of freedom: p is erfc(sqrt(chiSquare / 2)).
+TEST(Contingency, TheRevisionKeepsSmallProbabilities) {
+    const double eps = std::numeric_limits<double>::epsilon();
+    const auto revised = [](const std::vector<int32_t> &cells) {
+        return ContingencyOf(2, 2, cells, Contingency2026_head);
+    };
+    for (const int32_t count : {10, 100, 300}) {
+        const Contingency c = revised({count, 0, 0, count});
+        EXPECT_EQ(c.chiSquare, 2.0 * count);
+        const double p = static_cast<double>(std::erfc(std::sqrt(static_cast<long double>(count))));
+        EXPECT_NEAR(c.p, p, 4 * eps * p);
+    }
+    // Nearly independent large counts, where O - E cancels: n (a d - b c)^2 / products of sums.
+    const Contingency close = revised({1000000007, 1000000009, 1000000021, 1000000022});
+    const long double n = 4000000059.0L;
+    const long double difference = 1000000007.0L * 1000000022.0L - 1000000009.0L * 1000000021.0L;
+    const long double chiSquare =
+        n * difference * difference / 2000000016.0L / 2000000043.0L / 2000000028.0L / 2000000031.0L;
+    EXPECT_NEAR(close.chiSquare, static_cast<double>(chiSquare),
+                4 * eps * static_cast<double>(chiSquare));
+    const Contingency emptyRow = revised({0, 0, 3, 4});
+    EXPECT_EQ(emptyRow.err, 0);
+    EXPECT_TRUE(std::isnan(emptyRow.chiSquare) && std::isnan(emptyRow.p));
+    EXPECT_EQ(revised({1, 2, -3, 4}).err, ErrTableNegativeSize);
 }
 
 } // namespace
