@@ -20,6 +20,14 @@ struct LandenSums {
     double extra; // E = F E(m) / K(m) + extra
 };
 
+// floor((phi + pi / 2) / pi), but next to an odd multiple of pi / 2, where rounding decides that and
+// the sign of t = tan(phi), the number of half turns that belongs to t.
+double HalfTurns(double phi, double t) {
+    constexpr double steep = 1e6;
+    const double turns = std::floor((phi + kHalfPi) / kPi);
+    return std::fabs(t) > steep ? std::rint((phi - std::atan(t)) / kPi) : turns;
+}
+
 LandenSums Landen(double phi, double m) {
     double a = 1;
     double b = std::sqrt(1 - m);
@@ -31,8 +39,9 @@ LandenSums Landen(double phi, double m) {
     for (int round = 0; round < kMostRounds && std::fabs(c / a) > kEpsilon; ++round) {
         const double ratio = b / a;
         phi += std::atan(t * ratio) + turns * kPi;
-        turns = std::floor((phi + kHalfPi) / kPi);
-        t *= (1 + ratio) / (1 - ratio * t * t);
+        const double growth = (1 + ratio) / (1 - ratio * t * t);
+        t = std::isinf(t) ? -(1 + ratio) / (ratio * t) : t * growth;
+        turns = HalfTurns(phi, t);
         const double mean = std::sqrt(a * b);
         a = 0.5 * (a + b);
         b = mean;

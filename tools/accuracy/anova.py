@@ -157,6 +157,36 @@ def critical_rows():
         yield f"| {significance:g} | " + " | ".join(map(text, largest)) + " |"
 
 
+def nist_sets():
+    """NIST's sets for one factor: name and samples, in the doubles nearest to the published decimals."""
+    lines = [line for line in (ROOT / "src/stats/tests/data/nist_anova.dat").read_text().splitlines()
+             if line and line[0] != "#"]
+    while lines:
+        name, n, _ = lines[0].split()[:3]
+        levels = {}
+        for label, value in (line.split() for line in lines[1:1 + int(n)]):
+            levels.setdefault(label, []).append(float(value))
+        yield name, list(levels.values())
+        lines = lines[1 + int(n):]
+
+
+def one_way_rows():
+    """f against exact fractions of the same doubles."""
+    for name, samples in nist_sets():
+        exact = [[Fraction(value) for value in sample] for sample in samples]
+        n, k = sum(map(len, exact)), len(exact)
+        mean = sum(map(sum, exact)) / n
+        means = [sum(sample) / len(sample) for sample in exact]
+        between = sum(len(sample) * (m - mean)**2 for sample, m in zip(exact, means))
+        within = sum((value - m)**2 for sample, m in zip(exact, means) for value in sample)
+        f = between / (k - 1) / (within / (n - k))
+        y = np.concatenate(samples)
+        labels = np.repeat(np.arange(k), list(map(len, samples))).astype(np.int32)
+        found = [qx.call(name_, y, labels, k, 0.05)[2] for name_ in ("Anova1Way_head_2017", "Anova1Way_head_2026")]
+        found.append(stats.f_oneway(*samples).statistic)
+        yield f"| {name} | " + " | ".join(text(float(abs(Fraction(float(v)) / f - 1) / EPS)) for v in found) + " |"
+
+
 def table(head, rows):
     lines = ["| " + " | ".join(head) + " |", "|---" * len(head) + "|"]
     for row in rows:
@@ -182,6 +212,11 @@ factors fixed. R {R_VERSION}: `anova(lm(...))`.
 which the exact ones have neither.
 
 {table(["Data", "Choices", "Refused", "squares", "f", "p", "critical"], random_rows())}
+
+**One factor**: f of NIST's sets, whose means are up to 1e13 standard deviations from 0, against exact fractions
+of the same doubles.
+
+{table(["Set", "Anova1Way_head_2017", "Anova1Way_head_2026", "SciPy f_oneway"], one_way_rows())}
 
 **Critical values** by significance, over all sources of the data above with fixed factors.
 

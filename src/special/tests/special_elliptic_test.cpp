@@ -60,6 +60,27 @@ TEST(SpecialElliptic, SelectsTheCompleteForms) {
     EXPECT_NEAR(Value("Elliptic1", 0.3, Value("EllipticJ", 7.5, 0.3, 3)), 7.5, 1e-13);
 }
 
+// Where tan(phi)^2 is 1 / sqrt(1 - m), the integrals are K / 2 and (E + 1 - sqrt(1 - m)) / 2. There the
+// transformation doubles phi to pi / 2, where rounding makes the tangent of either sign or infinite.
+TEST(SpecialElliptic, PassesTheQuarterTurnsOfTheTransformation) {
+    for (int i = 1; i < 2000; ++i) {
+        const double m = i / 2000.0 + 1e-5 * std::sin(i);
+        const double root = std::sqrt(1 - m);
+        double phi = std::atan(std::sqrt(1 / root));
+        for (int steps = 0; steps < 3; ++steps)
+            phi = std::nextafter(phi, 0.0);
+        const double first = Value("Elliptic1", m, kNaN) / 2;
+        const double second = (Value("Elliptic2", m, kNaN) + 1 - root) / 2;
+        for (int steps = 0; steps < 7; ++steps, phi = std::nextafter(phi, 2.0)) {
+            EXPECT_NEAR(Value("Elliptic1", m, phi), first, 2e-14) << m << " " << phi;
+            EXPECT_NEAR(Value("Elliptic2", m, phi), second, 2e-14) << m << " " << phi;
+        }
+    }
+    EXPECT_NEAR(Value("Elliptic1", 0.68359375000000011, 0.9272952180016123), 1.0259330100195333,
+                1e-15)
+        << "an infinite tangent";
+}
+
 TEST(SpecialElliptic, ReturnsSoonForAnyArgument) { qx::test::ExpectSoon(Exports(), 1000000); }
 
 TEST(SpecialElliptic, LeavesNoStepAtAThreshold) {
