@@ -61,7 +61,7 @@ OTHERS = (
     ("NormDist* InvNdist*", "stats.norm"), ("TDist* InvTdist*", "stats.t"), ("FDist* InvFDist*", "stats.f"),
     ("ChiSquare* InvChiSquare*", "stats.chi2"),
     ("Contingency_head", "stats.contingency"), ("Anova1Way*", "stats.anova"), ("Anova2Way*", "stats.anova2"), ("ANOVA3Way*", "stats.anova3"),
-    ("QX_Gamma", "special.gamma"), ("QX_Beta", "special.beta"), ("QX_Gauss", "special.hyp2f1"),
+    ("QX_Gamma", "special.gamma"), ("QX_ExpI", "special.expn"), ("QX_Beta", "special.beta"), ("QX_Gauss", "special.hyp2f1"),
     ("QX_Elliptic1", "special.ellipk"), ("QX_Elliptic2", "special.ellipe"),
     ("PeakD20*", "measure.PeakFinder"), ("PeakDetector", "measure.trigger"), ("PulseMeas PulseParameters", "measure.pulses"),
     ("Triggerh", "measure.trigger"),

@@ -2,6 +2,7 @@
 
 #include "frame/constants.h"
 #include "special/gamma.h"
+#include "special/tables/exponential_integral.h"
 
 #include <array>
 #include <cmath>
@@ -94,7 +95,25 @@ double PowerSeries(double x, int32_t n) {
     return LogarithmicTerm(x, n) - sum;
 }
 
+// E_1, x > 0.
+double First(double x) {
+    constexpr double smallTo = 0.4, nearTo = 2.0, midTo = 10.0, farTo = 700.0;
+    if (x < smallTo)
+        return x * table::e1Small(x) - kEuler - std::log(x);
+    const double scaled = x < nearTo  ? table::e1Near(x)
+                          : x < midTo ? table::e1Mid(x)
+                                      : table::e1Far(1 / x);
+    if (x < farTo)
+        return std::exp(-x) * (scaled / x);
+    const double root = std::exp(-0.5 * x); // the whole one would lose digits as it underflows
+    return root * (scaled / x) * root;
+}
+
 } // namespace
+
+double FastExponentialIntegral(double x, int32_t n) {
+    return n == 1 && x > 0 && std::isfinite(x) ? First(x) : ExponentialIntegral(x, n);
+}
 
 double ExponentialIntegral(double x, int32_t n) {
     if (!std::isfinite(x) || n < 0 || x < 0)

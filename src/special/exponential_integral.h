@@ -12,6 +12,9 @@ namespace qx {
 // 5.1.52 for n > 5000, the continued fraction 5.1.22 for x > 1, the power series 5.1.12 below.
 double ExponentialIntegral(double x, int32_t n);
 
+// The same with E_1 by rational functions, down to the smallest numbers.
+double FastExponentialIntegral(double x, int32_t n);
+
 } // namespace qx
 
 #endif

@@ -53,6 +53,10 @@ EXPONENTIAL = [("n = 0, x to 700", product(logarithmic(1e-5, 700, 20), [0])),
                ("n = 5001 ... 1e9, x to 700", pairs(logarithmic(1e-5, 700, 40), [5001, 7000, 10**5, 10**9]))]
 SINE = rows(TINY, ("[0, 4]", linear(0.001, 4) + around(4.0)), ("[4, 8]", linear(4, 8) + around(8.0)),
             ("[8, 1e6]", logarithmic(8, 1e6)))
+EXPONENTIAL_2026 = [
+    (f"n = 1, {name}", [(x, 1) for x in points])
+    for name, points in (("[1e-300, 0.4]", logarithmic(1e-300, 0.4)), ("[0.4, 2]", linear(0.4, 2) + around(0.4)),
+                         ("[2, 10]", linear(2, 10) + around(2.0)), ("[10, 700]", linear(10, 700) + around(10.0)))]
 COSINE = rows(TINY, ("[0, 4]", linear(0.001, 4) + around(4.0) + [0.6165054856207162, 3.384180422551187]),
               ("[4, 8]", linear(4, 8) + around(8.0)), ("[8, 1e6]", logarithmic(8, 1e6)),
               ("[1e6, 1e20]", logarithmic(1e6, 1e20)))
@@ -69,6 +73,9 @@ FUNCTIONS = [
     Function("QX_ErfC", "do", mpmath.erfc, ERFC,
              {"GSL": from_gsl("gsl_sf_erfc", "d"), "C++": from_std("std_erfc", "d"), "SciPy": from_scipy("erfc")}),
     Function("QX_ExpI", "dio", exponential, EXPONENTIAL,
+             {"GSL": lambda x, n: from_gsl("gsl_sf_expint_En", "id")(n, x),
+              "C++": expint_of_one(from_std("std_expint", "d")), "SciPy": lambda x, n: from_scipy("expn")(n, x)}),
+    Function("QX_ExpI_2026", "dio", exponential, EXPONENTIAL_2026,
              {"GSL": lambda x, n: from_gsl("gsl_sf_expint_En", "id")(n, x),
               "C++": expint_of_one(from_std("std_expint", "d")), "SciPy": lambda x, n: from_scipy("expn")(n, x)}),
     Function("QX_SinI", "do", mpmath.si, SINE,

@@ -7,7 +7,7 @@ usage: integrals.py REPOSITORY [NAME...]
 
 import sys
 
-from mpmath import (chi, ci, cos, erf, erfc, euler, exp, log, mp, mpf, nstr, pi, polylog, shi, si, sin, sqrt)
+from mpmath import (chi, ci, cos, e1, erf, erfc, euler, exp, log, mp, mpf, nstr, pi, polylog, shi, si, sin, sqrt)
 
 from rational import Table, as_double, nodes
 
@@ -24,6 +24,20 @@ def error_function(folder):
     t.add("erfcMid", "exp(x^2) erfc(x) in x", lambda x: exp(x * x) * erfc(x), 1, 8, 8, 8, LOGARITHM)
     t.add("erfcFar", "exp(x^2) erfc(x) in x", lambda x: exp(x * x) * erfc(x), 8, mpf("26.65"), 5, 6)
     t.write(folder + "error_function.h")
+
+
+def exponential(folder):
+    t = Table("integrals.py", "QX_SPECIAL_TABLES_EXPONENTIAL_INTEGRAL_H")
+
+    def scaled(x):
+        return x * exp(x) * e1(x)
+    t.add("e1Small", "(E_1(x) + ln x + gamma) / x in x", lambda x: (e1(x) + log(x) + euler) / x if x else mpf(1),
+          0, mpf(2) / 5, 4, 4)
+    t.add("e1Near", "x exp(x) E_1(x) in x", scaled, mpf(2) / 5, 2, 8, 8, LOGARITHM)
+    t.add("e1Mid", "x exp(x) E_1(x) in x", scaled, 2, 10, 7, 7, LOGARITHM)
+    t.add("e1Far", "x exp(x) E_1(x) in 1 / x", lambda z: scaled(1 / z) if z > mpf(10)**-12 else 1 - z,
+          0, mpf(1) / 10, 7, 7)
+    t.write(folder + "exponential_integral.h")
 
 
 def dilogarithm(folder):
@@ -125,7 +139,7 @@ def hyperbolic(folder):
 
 
 if __name__ == "__main__":
-    made = {"error_function": error_function, "dilogarithm": dilogarithm, "trigonometric": trigonometric,
+    made = {"error_function": error_function, "exponential": exponential, "dilogarithm": dilogarithm, "trigonometric": trigonometric,
             "hyperbolic": hyperbolic}
     for name in sys.argv[2:] or made:
         made[name](sys.argv[1] + "/src/special/tables/")

@@ -149,7 +149,7 @@ NEWEST = {
         "gammaincc": "QX_GammaC", "beta": "QX_Beta_85", "betainc": "QX_Beta_85",
         "factorial": "QX_Fact", "factorialln": "QX_LnFact", "digamma": "QX_Psi",
         "zeta": "QX_Zeta", "stirling": "QX_Stirling", "erf": "QX_Erf", "erfc": "QX_ErfC",
-        "expn": "QX_ExpI", "sici": "QX_SinI", "sici_cosine": "QX_CosI", "shichi": "QX_SinhI",
+        "expn": "QX_ExpI_2026", "sici": "QX_SinI", "sici_cosine": "QX_CosI", "shichi": "QX_SinhI",
         "shichi_cosine": "QX_CoshI", "spence": "QX_Diln", "dawsn": "QX_Dawson",
         "fresnel": "QX_FresnelIntegrals", "ellipk": "QX_Elliptic1_85",
         "ellipkinc": "QX_Elliptic1_85", "ellipe": "QX_Elliptic2_85",

@@ -13,6 +13,8 @@ void QX_ErfC(double x, DBL *value) { *value = qx::ErfC(x); }
 
 void QX_ExpI(double x, int32_t n, DBL *value) { *value = qx::ExponentialIntegral(x, n); }
 
+void QX_ExpI_2026(double x, int32_t n, DBL *value) { *value = qx::FastExponentialIntegral(x, n); }
+
 void QX_SinI(double x, DBL *value) { *value = qx::SineIntegral(x); }
 
 void QX_CosI(double x, DBL *value) { *value = qx::CosineIntegral(x); }

@@ -19,6 +19,15 @@ std::vector<Recipe> SpecialIntegralRecipes() {
              return 0;
          },
          NoStatus},
+        {"QX_ExpI_2026",
+         [](Call &c) {
+             int output = 0;
+             for (const int32_t n : {0, 1, 2, 7})
+                 for (const double x : {0.3 / c.n, 0.9 / c.n, 0.6 * c.n, 5.5 * c.n, 710.0 + c.n})
+                     QX_ExpI_2026(x, n, c.scalar(output++));
+             return 0;
+         },
+         NoStatus},
         OfNumber("QX_SinI", QX_SinI),
         OfNumber("QX_CosI", QX_CosI),
         OfNumber("QX_SinhI", QX_SinhI),

@@ -32,6 +32,9 @@ for n in (0, 1, 2, 3, 7, 20, 100, 169, 170, 171, 1000, 5000, 5001, 100000):
         # exp(-x) of the rounded argument is exact enough; the series cancels a little below 1
         row("ExpI", [x, n], 0, exponential(n, mpf(x)), 12)
 
+for x in ORDINARY + [0.2, 1.3, 3.0, 5.5, 30.0, 400.0, 705.0] + list(sides(0.4, 2, 10)):
+    row("ExpI2026", [x, 1], 0, mpmath.e1(mpf(x)), 4)
+
 for x in ORDINARY + [1.9264476603173705, 2.0, 3.0, 5.0, 7.5, 12.0, 100.0, 12345.5, 1e8, 1e22, 1e120] + list(
         sides(4, 8)):
     m = mpf(x)
