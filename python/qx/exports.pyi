@@ -13,12 +13,20 @@ def Contingency_head(table: ArrayLike) -> tuple[float, float]:
     """Pearson's chi-square test of independence on a table of counts: the statistic, the sum of (O - ..."""
 
 
+def Contingency2026_head(table: ArrayLike) -> tuple[float, float]:
+    """As Contingency_head, with both numbers to the last digits: the statistic from exact O total - ..."""
+
+
 def Anova1Way_head(y: ArrayLike, labels: ArrayLike, k: int) -> tuple[float, float, float, float, float, float, float]:
     """One-way analysis of variance of y, whose element i belongs to the level labels[i], on *k levels: ..."""
 
 
 def Anova1Way_head_2017(y: ArrayLike, labels: ArrayLike, k: int, alpha: float) -> tuple[float, float, float, float, float, float, float, float]:
     """As Anova1Way_head, with the value that f exceeds with probability alpha, by bisection to 1e-4, ..."""
+
+
+def Anova1Way_head_2026(y: ArrayLike, labels: ArrayLike, k: int, alpha: float) -> tuple[float, float, float, float, float, float, float, float]:
+    """As Anova1Way_head_2017, by two passes over the exact differences to one observation, in twice ..."""
 
 
 def Anova2Way_head(y: ArrayLike, labelsA: ArrayLike, labelsB: ArrayLike, levelsA: int, levelsB: int, observations: int) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], NDArray[np.float64]]:
@@ -2039,6 +2047,10 @@ def QX_ErfC(x: float | ArrayLike) -> float | NDArray[Any]:
 
 def QX_ExpI(x: float | ArrayLike, n: int | ArrayLike) -> float | NDArray[Any]:
     """Exponential integral E_n(x), the integral of exp(-x t) / t^n from 1 to infinity: the expansion ..."""
+
+
+def QX_ExpI_2026(x: float | ArrayLike, n: int | ArrayLike) -> float | NDArray[Any]:
+    """As QX_ExpI, with E_1 by rational functions of own coefficients on four intervals, broken at 0.4, ..."""
 
 
 def QX_SinI(x: float | ArrayLike) -> float | NDArray[Any]:
