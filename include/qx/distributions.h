@@ -5,15 +5,15 @@
 
    Scalars travel by reference. The function result is 0 and the code stands in *err; on any code
    but 0 the result is NaN. A NaN as probability is not refused, but by the revisions of 2026: the
-   bisections then end at the lower end of their bracket. docs/accuracy has the measured errors. The numbers of formulas are
-   those of M. Abramowitz and I. A. Stegun, Handbook of mathematical functions, 1964. */
+   bisections then end at the lower end of their bracket. docs/accuracy has the measured errors. The
+   numbers of formulas are those of M. Abramowitz and I. A. Stegun, Handbook of mathematical functions, 1964. */
 
 #include "qx/types.h"
 
 QX_BEGIN_DECLS
 
 /** P(X <= x) of the standard normal distribution, by the approximation 26.2.16: absolute error
-    about 1e-5; in the upper tail 1 less it keeps no digit. NormDist2026_head is within 2 eps.
+    about 1e-5; in the upper tail 1 less it keeps no digit. NormDist2026_head is within 3 eps.
     NaN: x in all results. */
 QX_API int32_t NormDist_head(QX_IN const DBL *x, QX_OUT DBL *p);
 
@@ -75,7 +75,7 @@ QX_API int32_t InvFDist_head(QX_IN const DBL *p, QX_IN const int32_t *n, QX_IN c
 QX_API int32_t InvChiSquare_head(QX_IN const DBL *p, QX_IN const int32_t *dof, QX_OUT DBL *x,
                                  QX_OUT ErrorCode *err);
 
-/** A value of the standard normal distribution at *x, within 2 eps and down to the smallest numbers:
+/** A value of the standard normal distribution at *x, within 3 eps and down to the smallest numbers:
     exp(-x^2 / 2), its square in twice the precision, times rational functions for the ratio to the
     tail. The larger of probability and survival is 1 less the other. *what: 0 the probability
     P(X <= x); 1 the survival P(X > x); 2 the logarithm of the probability; 3 the logarithm of the
@@ -87,8 +87,7 @@ QX_API int32_t NormDist2026_head(QX_IN const DBL *x, QX_IN const int32_t *what, 
 /** As NormDist2026_head, of Student's distribution with *dof degrees of freedom, which need not be
     whole; above 1e25, infinity included, they count as 1e25, where the distribution is the normal
     one. Method: the smaller tail is the incomplete beta integral in the logarithm of t / (1 - t) by
-    quadrature, its front in twice the precision (C. Loader, Fast and accurate computation of
-    binomial probabilities, 2000).
+    quadrature, its front in twice the precision (C. Loader's deviance).
     Codes: ErrInvalidSelector (what is another number), ErrTooFewForParameters (dof is not above 0),
     ErrNaNInData (t is NaN). */
 QX_API int32_t TDist2026_head(QX_IN const DBL *t, QX_IN const DBL *dof, QX_IN const int32_t *what,

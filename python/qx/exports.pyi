@@ -382,7 +382,7 @@ def InvChiSquare_head(p: float | ArrayLike, dof: int | ArrayLike) -> float | NDA
 
 
 def NormDist2026_head(x: float | ArrayLike, what: int | ArrayLike) -> float | NDArray[Any]:
-    """A value of the standard normal distribution at *x, within 2 eps and down to the smallest ..."""
+    """A value of the standard normal distribution at *x, within 3 eps and down to the smallest ..."""
 
 
 def TDist2026_head(t: float | ArrayLike, dof: float | ArrayLike, what: int | ArrayLike) -> float | NDArray[Any]:
