@@ -6,7 +6,8 @@
    Scalars travel by reference. The function result is 0 and the code stands in *err; on any code
    but 0 the result is NaN. A NaN as probability is not refused, but by the revisions of 2026: the
    bisections then end at the lower end of their bracket. docs/accuracy has the measured errors. The
-   numbers of formulas are those of M. Abramowitz and I. A. Stegun, Handbook of mathematical functions, 1964. */
+   numbers of formulas are those of M. Abramowitz and I. A. Stegun, Handbook of mathematical
+   functions, 1964. */
 
 #include "qx/types.h"
 
@@ -27,8 +28,8 @@ QX_API int32_t TDist_head(QX_IN const DBL *t, QX_IN const int32_t *dof, QX_OUT D
                           QX_OUT ErrorCode *err);
 
 /** P(F <= f) of Fisher's distribution with *n and *d degrees of freedom, 1 - I_z(d / 2, n / 2) with
-    z = d / (d + n f) (26.5.28); 0 for f up to 0. All digits are
-    lost for small f, 2.5e5 eps at 30000 degrees; FDist2026_head is within 4 eps.
+    z = d / (d + n f) (26.5.28); 0 for f up to 0. All digits are lost for small f, 2.5e5 eps at 30000
+    degrees; FDist2026_head is within 4 eps.
     Codes: ErrTooFewForParameters (n or d is below 1), ErrNaNInData (f is NaN).
     NaN: f refused with ErrNaNInData. */
 QX_API int32_t FDist_head(QX_IN const DBL *f, QX_IN const int32_t *n, QX_IN const int32_t *d,
