@@ -1,8 +1,8 @@
 // Singular values, eigenproblems and factorisations against the LAPACK of OpenBLAS
 // (bench/peer_lapack.h).
 //
-// bench_linalg_factorisations [GROUP...]: svd, values, symmetric, general, qr, cholesky; all by
-// default.
+// bench_linalg_factorisations [GROUP...]: svd, values, svd2026, values2026, symmetric, general, qr,
+// cholesky; all by default.
 
 #include "bench/peer_lapack.h"
 #include "bench/timing.h"
@@ -75,9 +75,11 @@ constexpr auto Real = qx::ElementType::DBL;
 
 const std::vector<int32_t> orders = {2, 4, 8, 16, 50, 100, 200, 500};
 
-void SingularValueDecomposition(bool withVectors) {
+void SingularValueDecomposition(bool withVectors, qx::SVDScaling scaling) {
     const auto dgesvd = qx::bench::PeerRoutine<decltype(dgesvd_)>("dgesvd_");
-    Ratios ratios(withVectors ? "singular value decompositions" : "singular values");
+    const std::string revision = scaling == qx::SVDScaling::Always ? ", revision" : "";
+    const std::string title = withVectors ? "singular value decompositions" : "singular values";
+    Ratios ratios((title + revision).c_str());
     for (const int32_t n : orders) {
         const std::vector<double> a = Random(n);
         std::vector<double> u(a.size()), s(n), v(a.size()), copy;
@@ -90,13 +92,13 @@ void SingularValueDecomposition(bool withVectors) {
         copy = a;
         std::vector<double> work = WorkFor(driver);
         Compare(
-            ratios, withVectors ? "svd" : "singular values", n,
+            ratios, ((withVectors ? "svd" : "values") + revision).c_str(), n,
             [&] {
                 if (withVectors)
                     qx::SVDecompose<Real>({a.data(), n, n}, {u.data(), n, n}, {s.data(), n},
-                                          {v.data(), n, n});
+                                          {v.data(), n, n}, scaling);
                 else
-                    qx::SingularValues<Real>({a.data(), n, n}, {s.data(), n});
+                    qx::SingularValues<Real>({a.data(), n, n}, {s.data(), n}, scaling);
             },
             [&] {
                 copy = a;
@@ -215,8 +217,10 @@ void Cholesky() {
 
 int main(int argc, char **argv) {
     const std::pair<const char *, void (*)()> groups[] = {
-        {"svd", [] { SingularValueDecomposition(true); }},
-        {"values", [] { SingularValueDecomposition(false); }},
+        {"svd", [] { SingularValueDecomposition(true, qx::SVDScaling::LargeNorms); }},
+        {"values", [] { SingularValueDecomposition(false, qx::SVDScaling::LargeNorms); }},
+        {"svd2026", [] { SingularValueDecomposition(true, qx::SVDScaling::Always); }},
+        {"values2026", [] { SingularValueDecomposition(false, qx::SVDScaling::Always); }},
         {"symmetric", SymmetricEigenproblem},
         {"general", GeneralEigenproblem},
         {"qr", QR},

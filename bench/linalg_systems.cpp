@@ -2,7 +2,7 @@
 // an export adds to its inner routine.
 //
 // bench_linalg_systems [GROUP...]: products, tiny, complexproducts, small, solve, complex, inverse,
-// frame; all by default.
+// sets, frame; all by default.
 
 #include "bench/peer_lapack.h"
 #include "bench/timing.h"
@@ -157,6 +157,39 @@ void Inverse() {
     ratios.summary("LAPACK dgesv on the unit matrix");
 }
 
+// With an estimate of the condition, ten right sides.
+void SolveSets() {
+    Ratios ratios("ten right sides with the condition");
+    for (const int32_t n : {4, 8, 32, 100, 300, 1000}) {
+        constexpr int32_t sides = 10;
+        const auto a = Random(static_cast<std::size_t>(n) * n);
+        const auto b = Random(static_cast<std::size_t>(n) * sides);
+        std::vector<double> factors(a.size()), x(b.size()), other(b.size()), work(4 * n);
+        std::vector<int32_t> pivots(n), integers(n);
+        double reciprocal;
+        const auto dlange = qx::bench::PeerRoutine<decltype(dlange_)>("dlange_");
+        const auto dgesv = qx::bench::PeerRoutine<decltype(dgesv_)>("dgesv_");
+        const auto dgecon = qx::bench::PeerRoutine<decltype(dgecon_)>("dgecon_");
+        Compare(
+            ratios, "solve set", n,
+            [&] {
+                qx::SolveSetByLU<Real>({a.data(), n, n}, {b.data(), n, sides}, {x.data(), n, sides},
+                                       &reciprocal);
+            },
+            [&] {
+                int32_t info;
+                factors = a;
+                other = b;
+                const double norm = dlange("1", &n, &n, factors.data(), &n, work.data());
+                dgesv(&n, &sides, factors.data(), &n, pivots.data(), other.data(), &n,
+                             &info);
+                dgecon("1", &n, factors.data(), &n, &norm, &reciprocal, work.data(),
+                              integers.data(), &info);
+            });
+    }
+    ratios.summary("LAPACK dgesv and dgecon");
+}
+
 void Frame() {
     const qx::host::Array2D<double> a(1, 1);
     const qx::host::Array1D<double> b({1.0}), x({1.0});
@@ -199,6 +232,8 @@ int main(int argc, char **argv) {
                                     {1, 2, 4, 8, 16, 32, 64, 100, 200, 500, 1000});
     if (wanted("inverse"))
         Inverse();
+    if (wanted("sets"))
+        SolveSets();
     if (wanted("frame"))
         Frame();
 }

@@ -24,13 +24,30 @@ QX_API int32_t CxEqsByLUDri_head(QX_IN CDB2D a, QX_IN CDB1D b, QX_OUT CDB1D x,
                                  QX_OUT ErrorCode *err);
 
 /** Not available: it checks its arguments, sizes x, empties it and fails. Several right sides are
-    solved for by EqsSetBySVDDri_head.
+    solved for by EqsSetByLU2026_head.
     Codes: ErrEmptyInput (a or b is empty), ErrNotSquare (a is not square), ErrSizeMismatch (b
     has not as many rows as a), ErrOutOfMemory (the host refused the resize), ErrNotAvailable
     (always). */
 QX_API ErrorCode EqsSetByLUDri_head(QX_IN DBL2D a, QX_IN DBL2D b, QX_OUT DBL2D x);
 /** As EqsSetByLUDri_head, for complex data. */
 QX_API ErrorCode CxEqsSetByLUDri_head(QX_IN CDB2D a, QX_IN CDB2D b, QX_OUT CDB2D x);
+
+/** Solves a x = b for all columns of b by LU factorisation with row exchanges, for a square matrix
+    of any size of elements: a and each column of b are scaled by powers of two, and the solutions
+    are scaled back. *reciprocalCondition is 1 / (|a| |a^-1|) in the 1-norm, whose second factor is
+    estimated from below: seldom by more than a factor of 3 (N. J. Higham, "FORTRAN codes for
+    estimating the one-norm of a real or complex matrix", 1988). About that many times 2.2e-16 is
+    the relative error of x, while |b - a x| is a few n eps |a| |x| (docs/accuracy/matrix_revisions.md).
+    Elements of x that overflow are infinite.
+    Codes: ErrEmptyInput (a or b is empty), ErrNotSquare (a is not square), ErrSizeMismatch (b has
+    not as many rows as a), ErrOutOfMemory (no memory, or the host refused the resize),
+    ErrNonFiniteInput (a or b holds NaN or infinity), ErrSingularMatrix (a column has no pivot but
+    0), WarnLowAccuracy (the reciprocal condition is below 2.2e-16: no digit of x is certain). */
+QX_API ErrorCode EqsSetByLU2026_head(QX_IN DBL2D a, QX_IN DBL2D b, QX_OUT DBL2D x,
+                                     QX_OUT DBL *reciprocalCondition);
+/** As EqsSetByLU2026_head, for complex data. */
+QX_API ErrorCode CxEqsSetByLU2026_head(QX_IN CDB2D a, QX_IN CDB2D b, QX_OUT CDB2D x,
+                                       QX_OUT DBL *reciprocalCondition);
 
 /** Solves in place of b with the factors and pivots of LU_head. A zero on the diagonal gives
     infinities or NaN.
@@ -66,8 +83,8 @@ QX_API int32_t CxLUInvMatrix_head(QX_INOUT CDB2D lu, QX_IN I32_1D pivots, QX_OUT
     Values up to max(m, n) times 2.2e-16 times the largest one count as 0; a lack of rank is no
     failure. Where the norm of a is below 1, digits are lost (SVD_head): the relative error of x is
     up to about 2.2e-16 times the condition number divided by the norm, for a condition number of
-    1000 measured 3e-9 at a norm of 1e-4, 3e-5 at 1e-8 and 0.3 at 1e-12; scale a and b up. A refused
-    resize gives the host's own status as the function result.
+    1000 measured 3e-9 at a norm of 1e-4, 3e-5 at 1e-8 and 0.3 at 1e-12; GenLinEqs2026_head keeps
+    them. A refused resize gives the host's own status as the function result.
     Codes: ErrSizeMismatch (b has not as many elements as a has rows), ErrEmptyInput (a has no
     column, or a and b are empty), ErrOutOfMemory (no memory, or the host refused the resize),
     ErrNonFiniteInput (a or b holds NaN or infinity), ErrIterationLimit (the singular values do not
@@ -110,7 +127,8 @@ QX_API ErrorCode GenLinEqsbySVD2011_head(QX_IN DBL2D a, QX_IN DBL1D b, QX_OUT DB
                                          double tolerance, int32_t refinements, QX_OUT DBL1D work);
 
 /** Least-squares solutions of smallest norm of a x = b for all columns of b, as GenLinEqs_head
-    gives them, with the digits that it loses at small norms. Here a lack of rank shows in the code.
+    gives them, with the digits that it loses at small norms, which EqsSetBySVD2026_head keeps. Here
+    a lack of rank shows in the code.
     Codes: ErrEmptyInput (a or b is empty), ErrSizeMismatch (b has not as many rows as a),
     ErrOutOfMemory (no memory, or the host refused the resize), ErrNonFiniteInput (a or b holds NaN
     or infinity), ErrIterationLimit (the singular values do not converge), WarnRankDeficient
@@ -128,6 +146,31 @@ QX_API ErrorCode EqsSetBySVDDri82_head(QX_IN DBL2D a, QX_IN DBL2D b, QX_OUT DBL2
 /** As EqsSetBySVDDri82_head, for complex data. */
 QX_API ErrorCode CxEqsSetBySVDDri82_head(QX_IN CDB2D a, QX_IN CDB2D b, QX_OUT CDB2D x,
                                          double tolerance);
+
+/** Least-squares solution of smallest norm of a x = b for an m by n matrix of any norm, by the
+    singular values of SVD2026_head. Values up to max(m, n) times the tolerance times the largest one
+    count as 0; a tolerance below 0, or NaN, is 2.2e-16. a and b are scaled by powers of two,
+    and x is scaled back, so that 2^j a gives the digits of a; what overflows is infinite. The
+    relative error of x is a few n eps times the condition number for small residuals, at any norm.
+    Codes: ErrEmptyInput (a or b is empty), ErrSizeMismatch (b has not as many elements as a has
+    rows), ErrOutOfMemory (no memory, or the host refused the resize), ErrNonFiniteInput (a or b
+    holds NaN or infinity), ErrIterationLimit (the singular values do not converge),
+    WarnRankDeficient (singular values count as 0; x is valid). */
+QX_API ErrorCode GenLinEqs2026_head(QX_IN DBL2D a, QX_IN DBL1D b, QX_OUT DBL1D x, double tolerance);
+/** As GenLinEqs2026_head, for complex data. */
+QX_API ErrorCode CxGenLinEqs2026_head(QX_IN CDB2D a, QX_IN CDB1D b, QX_OUT CDB1D x,
+                                      double tolerance);
+
+/** As GenLinEqs2026_head, for all columns of b, each of which is scaled by itself.
+    Codes: ErrEmptyInput (a or b is empty), ErrSizeMismatch (b has not as many rows as a),
+    ErrOutOfMemory (no memory, or the host refused the resize), ErrNonFiniteInput (a or b holds NaN
+    or infinity), ErrIterationLimit (the singular values do not converge), WarnRankDeficient
+    (singular values count as 0; x is valid). */
+QX_API ErrorCode EqsSetBySVD2026_head(QX_IN DBL2D a, QX_IN DBL2D b, QX_OUT DBL2D x,
+                                      double tolerance);
+/** As EqsSetBySVD2026_head, for complex data. */
+QX_API ErrorCode CxEqsSetBySVD2026_head(QX_IN CDB2D a, QX_IN CDB2D b, QX_OUT CDB2D x,
+                                        double tolerance);
 
 /** Solves a x = b for a positive definite a by Cholesky factorisation, of which the upper triangle
     is read.

@@ -138,8 +138,8 @@ QX_API ErrorCode CxQRDecH(QX_IN CDB2D a, int32_t pivoting, int32_t economy,
     below 1 it is off by up to 2.2e-16: relative to the norm 2e-10 at a norm of 1e-6, 2e-4 at 1e-12,
     and no digit is right below 1e-15 (measured). Values lose digits later, relative to the largest
     one 1e-14 at 1e-8, 1e-6 at 1e-12 and 1e-2 at 1e-14. A matrix of a norm below 1 should be scaled
-    up first, and so for every export that stands on this decomposition. A value that overflows is
-    infinite.
+    up first, and so for every export that stands on this decomposition; SVD2026_head does that by
+    itself. A value that overflows is infinite.
     Codes: ErrEmptyInput (a is empty), ErrOutOfMemory (no memory), ErrNonFiniteInput (an element is
     not finite), ErrIterationLimit (100 iterations were not enough for a value).
     NaN: a refused with ErrNonFiniteInput. */
@@ -159,6 +159,28 @@ QX_API ErrorCode CxSVDEx_head(QX_IN CDB2D a, int32_t fullSize, QX_OUT CDB2D u, Q
 QX_API int32_t SVDS_head(QX_IN DBL2D a, QX_OUT DBL1D s, QX_OUT ErrorCode *err);
 /** As SVDS_head, for complex elements. */
 QX_API int32_t CxSVDS_head(QX_IN CDB2D a, QX_OUT DBL1D s, QX_OUT ErrorCode *err);
+
+/** Singular value decomposition a = u diag(s) v^T of the m by n matrix a, k = min(m, n), of any
+    norm: u is m by k, s has k falling values, and v is n by k; with fullSize other than 0 u is m by
+    m and v is n by n. The matrix is scaled by a power of two, decomposed as SVD_head does, and the
+    values are scaled back; 2^j a has the same u and v, to the bit. |a - u diag(s) v^T| is up to 4
+    max(m, n) eps |a|, u and v are orthogonal within 8 max(m, n) eps, and the values are within max(m,
+    n) eps s[0] of LAPACK's, from 1e-300 to 1e300 (docs/accuracy/matrix_revisions.md). Values
+    much smaller than s[0] have that absolute error and no better one. A value that overflows is
+    infinite. G. H. Golub and C. Reinsch, "Singular value decomposition and least squares solutions",
+    1970.
+    Codes: ErrEmptyInput (a is empty), ErrOutOfMemory (no memory, or the host refuses a resize),
+    ErrNonFiniteInput (an element is not finite), ErrIterationLimit (100 iterations were not enough
+    for a value). */
+QX_API ErrorCode SVD2026_head(QX_IN DBL2D a, int32_t fullSize, QX_OUT DBL2D u, QX_OUT DBL1D s,
+                              QX_OUT DBL2D v);
+/** As SVD2026_head, for complex elements: a = u diag(s) v^H. */
+QX_API ErrorCode CxSVD2026_head(QX_IN CDB2D a, int32_t fullSize, QX_OUT CDB2D u, QX_OUT DBL1D s,
+                                QX_OUT CDB2D v);
+/** As SVD2026_head, the values alone: the same to the bit as with the vectors. */
+QX_API ErrorCode SVDS2026_head(QX_IN DBL2D a, QX_OUT DBL1D s);
+/** As SVDS2026_head, for complex elements. */
+QX_API ErrorCode CxSVDS2026_head(QX_IN CDB2D a, QX_OUT DBL1D s);
 
 /** Hessenberg form h = q^T a q of the square matrix a, in its place, by Householder reflections:
     zero below the first subdiagonal. Rows and columns low to high, counted from 1 as

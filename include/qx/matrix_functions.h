@@ -84,8 +84,8 @@ QX_API ErrorCode CxMatrixPower_head(QX_INOUT CDB2D a, int32_t power);
     number, count as 0; a negative one stands for max(m, n) s[0] 2.2e-16. Where the norm of a is
     below 1, digits are lost (SVD_head): the relative error is up to about 2.2e-16 times the
     condition number divided by the norm, for a condition number of 1000 measured 2e-9 at a norm of
-    1e-4, 2e-5 at 1e-8 and 0.2 at 1e-12; scale a up. Where 1/s overflows, elements are infinite or
-    NaN.
+    1e-4, 2e-5 at 1e-8 and 0.2 at 1e-12; PseudoInverse2026_head keeps them. Where 1/s
+    overflows, elements are infinite or NaN.
     Codes: ErrEmptyInput (a is empty), ErrOutOfMemory (no memory), ErrNonFiniteInput (an element is
     not finite), ErrIterationLimit (the singular value iteration did not converge).
     NaN: a refused with ErrNonFiniteInput; tolerance in no result. */
@@ -94,6 +94,19 @@ QX_API int32_t PseudoInverse_head(QX_INOUT DBL2D a, QX_IN const double *toleranc
 /** As PseudoInverse_head, for complex elements. */
 QX_API int32_t CxPseudoInverse_head(QX_INOUT CDB2D a, QX_IN const double *tolerance,
                                     QX_OUT ErrorCode *err);
+
+/** The pseudo-inverse (E. H. Moore, R. Penrose) of the m by n matrix a of any norm, n by m: v
+    diag(1/s) u^T of its singular value decomposition. Values not above the tolerance, an absolute
+    number, count as 0; a negative one, or NaN, stands for max(m, n) s[0] 2.2e-16. The matrix is
+    scaled by a power of two and the result scaled back, so that 2^j a has the digits of a. The
+    relative error is a few times max(m, n) eps times the condition number. Where 1/s overflows,
+    elements are infinite or NaN.
+    Codes: ErrEmptyInput (a is empty), ErrOutOfMemory (no memory, or the host refuses the resize),
+    ErrNonFiniteInput (an element is not finite), ErrIterationLimit (the singular value iteration
+    did not converge). */
+QX_API ErrorCode PseudoInverse2026_head(QX_IN DBL2D a, double tolerance, QX_OUT DBL2D out);
+/** As PseudoInverse2026_head, for complex elements. */
+QX_API ErrorCode CxPseudoInverse2026_head(QX_IN CDB2D a, double tolerance, QX_OUT CDB2D out);
 
 QX_END_DECLS
 

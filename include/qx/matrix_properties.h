@@ -29,8 +29,8 @@ QX_API int32_t CxDeterminant_head(QX_IN CDB2D a, QX_IN const int32_t *matrixType
 /** Numerical rank: the number of singular values above *tolerance, which is max(m, n) times the
     largest one times 2.2e-16 if negative. Where the norm of a is below 1, values that should vanish
     are up to 2.2e-16 (SVD_head), which the default takes for rank: of 500 matrices of order 8 and
-    rank 4 it counts wrong in 41 at a norm of 0.01, 208 at 1e-6 and 463 at 1e-12 (measured); scale a
-    up, or give a tolerance. A largest value that overflows gives rank 0 then. A failure leaves -1.
+    rank 4 it counts wrong in 41 at a norm of 0.01, 208 at 1e-6 and 463 at 1e-12 (measured);
+    Rank2026_head does not. A largest value that overflows gives rank 0 then. A failure leaves -1.
     Codes: ErrEmptyInput (a is empty), ErrNonFiniteInput (a holds NaN or infinity), ErrOutOfMemory
     (no memory), ErrIterationLimit (the singular values do not converge).
     NaN: a refused with ErrNonFiniteInput; tolerance in no result. */
@@ -44,7 +44,8 @@ QX_API int32_t CxRank_head(QX_IN CDB2D a, QX_IN const double *tolerance, QX_OUT 
     any matrix; 1 to 3 the norm of a square matrix (as in Norm_head) times that of its inverse.
     Infinity for a singular matrix, which is no failure, and where the number overflows. Type 0
     loses digits where the norm of a is far below 1 (SVD_head): for a condition number of 1000 it is
-    off by 6e-9 at a norm of 1e-8, 5e-4 at 1e-10 and 8e-2 at 1e-12 (measured).
+    off by 6e-9 at a norm of 1e-8, 5e-4 at 1e-10 and 8e-2 at 1e-12 (measured); CondNumber2026_head
+    keeps them.
     Codes: ErrEmptyInput (a is empty), ErrNonFiniteInput (a holds NaN or infinity),
     ErrInvalidSelector (*normType is not 0 to 3), ErrNotSquare (a is not square, of types 1 to 3),
     ErrOutOfMemory (no memory), ErrIterationLimit (the singular values do not converge).
@@ -59,7 +60,7 @@ QX_API int32_t CxCondNumber_head(QX_IN CDB2D a, QX_IN const int32_t *normType, Q
     the root of the sum of squares (Frobenius); 3 the largest row sum of moduli. Sums that overflow
     give infinity, those of squares from elements of about 1e154 on; squares of elements below
     1e-162 vanish. Type 0 loses digits where the norm is far below 1 (SVD_head): 7e-10 of it at
-    1e-10, 3e-7 at 1e-12 and 5e-3 at 1e-14 (measured).
+    1e-10, 3e-7 at 1e-12 and 5e-3 at 1e-14 (measured). Norm2026_head has neither fault.
     Codes: ErrEmptyInput (a is empty), ErrNonFiniteInput (a holds NaN or infinity),
     ErrInvalidSelector (*normType is not 0 to 3), ErrOutOfMemory (no memory), ErrIterationLimit (the
     singular values do not converge).
@@ -69,6 +70,39 @@ QX_API int32_t Norm_head(QX_IN DBL2D a, QX_IN const int32_t *normType, QX_OUT DB
 /** As Norm_head, for complex data. */
 QX_API int32_t CxNorm_head(QX_IN CDB2D a, QX_IN const int32_t *normType, QX_OUT DBL *norm,
                            QX_OUT ErrorCode *err);
+
+/** Numerical rank of a matrix of any norm: the number of singular values above the tolerance, which
+    is max(m, n) times the largest one times 2.2e-16 if negative or NaN. The values are those of
+    SVDS2026_head; one that overflows is above any tolerance.
+    Codes: ErrEmptyInput (a is empty), ErrNonFiniteInput (a holds NaN or infinity), ErrOutOfMemory
+    (no memory), ErrIterationLimit (the singular values do not converge). */
+QX_API ErrorCode Rank2026_head(QX_IN DBL2D a, double tolerance, QX_OUT int32_t *rank);
+/** As Rank2026_head, for complex data. */
+QX_API ErrorCode CxRank2026_head(QX_IN CDB2D a, double tolerance, QX_OUT int32_t *rank);
+
+/** Condition number of a matrix of any norm. normType: 0 the quotient of the largest and the
+    smallest singular value, of any matrix; 1 the largest column sum of moduli of a square matrix
+    times that of its inverse; 2 the same with the Frobenius norm; 3 the same with the largest row
+    sum. The matrix is scaled by a power of two first, which changes no condition number. Infinity
+    for a singular matrix, which is no failure, and where the number overflows. The relative error
+    is about the number itself times 2.2e-16.
+    Codes: ErrEmptyInput (a is empty), ErrNonFiniteInput (a holds NaN or infinity),
+    ErrInvalidSelector (normType is not 0 to 3), ErrNotSquare (a is not square, of types 1 to 3),
+    ErrOutOfMemory (no memory), ErrIterationLimit (the singular values do not converge). */
+QX_API ErrorCode CondNumber2026_head(QX_IN DBL2D a, int32_t normType, QX_OUT DBL *cond);
+/** As CondNumber2026_head, for complex data. */
+QX_API ErrorCode CxCondNumber2026_head(QX_IN CDB2D a, int32_t normType, QX_OUT DBL *cond);
+
+/** Norm of a matrix. normType: 0 the largest singular value; 1 the largest column sum of moduli; 2
+    the root of the sum of squares (Frobenius); 3 the largest row sum of moduli. The matrix is
+    scaled by a power of two first, so that only a norm that overflows itself is infinite. The
+    relative error is a few times max(m, n) eps.
+    Codes: ErrEmptyInput (a is empty), ErrNonFiniteInput (a holds NaN or infinity),
+    ErrInvalidSelector (normType is not 0 to 3), ErrOutOfMemory (no memory), ErrIterationLimit (the
+    singular values do not converge). */
+QX_API ErrorCode Norm2026_head(QX_IN DBL2D a, int32_t normType, QX_OUT DBL *norm);
+/** As Norm2026_head, for complex data. */
+QX_API ErrorCode CxNorm2026_head(QX_IN CDB2D a, int32_t normType, QX_OUT DBL *norm);
 
 /** Sum of the diagonal of a square matrix.
     Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty).

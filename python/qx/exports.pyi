@@ -913,6 +913,14 @@ def CxEqsSetByLUDri_head(a: ArrayLike, b: ArrayLike) -> NDArray[np.complex128]:
     """As EqsSetByLUDri_head, for complex data. Not available: it checks its arguments, sizes x, ..."""
 
 
+def EqsSetByLU2026_head(a: ArrayLike, b: ArrayLike) -> tuple[NDArray[np.float64], float]:
+    """Solves a x = b for all columns of b by LU factorisation with row exchanges, for a square matrix ..."""
+
+
+def CxEqsSetByLU2026_head(a: ArrayLike, b: ArrayLike) -> tuple[NDArray[np.complex128], float]:
+    """As EqsSetByLU2026_head, for complex data. Solves a x = b for all columns of b by LU ..."""
+
+
 def LULinEqs_head(lu: ArrayLike, pivots: ArrayLike, b: ArrayLike) -> NDArray[np.float64]:
     """Solves in place of b with the factors and pivots of LU_head."""
 
@@ -975,6 +983,22 @@ def EqsSetBySVDDri82_head(a: ArrayLike, b: ArrayLike, tolerance: float) -> NDArr
 
 def CxEqsSetBySVDDri82_head(a: ArrayLike, b: ArrayLike, tolerance: float) -> NDArray[np.complex128]:
     """As EqsSetBySVDDri82_head, for complex data. Least-squares solutions of smallest norm of a x = b ..."""
+
+
+def GenLinEqs2026_head(a: ArrayLike, b: ArrayLike, tolerance: float) -> NDArray[np.float64]:
+    """Least-squares solution of smallest norm of a x = b for an m by n matrix of any norm, by the ..."""
+
+
+def CxGenLinEqs2026_head(a: ArrayLike, b: ArrayLike, tolerance: float) -> NDArray[np.complex128]:
+    """As GenLinEqs2026_head, for complex data. Least-squares solution of smallest norm of a x = b for ..."""
+
+
+def EqsSetBySVD2026_head(a: ArrayLike, b: ArrayLike, tolerance: float) -> NDArray[np.float64]:
+    """As GenLinEqs2026_head, for all columns of b, each of which is scaled by itself. Least-squares ..."""
+
+
+def CxEqsSetBySVD2026_head(a: ArrayLike, b: ArrayLike, tolerance: float) -> NDArray[np.complex128]:
+    """As EqsSetBySVD2026_head, for complex data. Least-squares solution of smallest norm of a x = b ..."""
 
 
 def EqsByCholeskyDri_head(a: ArrayLike, b: ArrayLike) -> NDArray[np.float64]:
@@ -1177,6 +1201,22 @@ def CxSVDS_head(a: ArrayLike) -> NDArray[np.float64]:
     """As SVDS_head, for complex elements. Singular value decomposition a = u diag(s) v^T of the m by n ..."""
 
 
+def SVD2026_head(a: ArrayLike, fullSize: int) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.float64]]:
+    """Singular value decomposition a = u diag(s) v^T of the m by n matrix a, k = min(m, n), of any ..."""
+
+
+def CxSVD2026_head(a: ArrayLike, fullSize: int) -> tuple[NDArray[np.complex128], NDArray[np.float64], NDArray[np.complex128]]:
+    """As SVD2026_head, for complex elements: a = u diag(s) v^H. Singular value decomposition a = u ..."""
+
+
+def SVDS2026_head(a: ArrayLike) -> NDArray[np.float64]:
+    """As SVD2026_head, the values alone: the same to the bit as with the vectors. Singular value ..."""
+
+
+def CxSVDS2026_head(a: ArrayLike) -> NDArray[np.float64]:
+    """As SVDS2026_head, for complex elements. Singular value decomposition a = u diag(s) v^T of the m ..."""
+
+
 def Hessenberg_head(a: ArrayLike, low: int, high: int) -> tuple[NDArray[np.float64], NDArray[np.float64]]:
     """Hessenberg form h = q^T a q of the square matrix a, in its place, by Householder reflections: ..."""
 
@@ -1243,6 +1283,14 @@ def PseudoInverse_head(a: ArrayLike, tolerance: float) -> NDArray[np.float64]:
 
 def CxPseudoInverse_head(a: ArrayLike, tolerance: float) -> NDArray[np.complex128]:
     """As PseudoInverse_head, for complex elements. The pseudo-inverse (E."""
+
+
+def PseudoInverse2026_head(a: ArrayLike, tolerance: float) -> NDArray[np.float64]:
+    """The pseudo-inverse (E."""
+
+
+def CxPseudoInverse2026_head(a: ArrayLike, tolerance: float) -> NDArray[np.complex128]:
+    """As PseudoInverse2026_head, for complex elements. The pseudo-inverse (E."""
 
 
 def MatrixMulAligned_head(a: ArrayLike, b: ArrayLike, alignedCopy: int) -> NDArray[np.float64]:
@@ -1323,6 +1371,30 @@ def Norm_head(a: ArrayLike, normType: int) -> float:
 
 def CxNorm_head(a: ArrayLike, normType: int) -> float:
     """As Norm_head, for complex data. Norm of a matrix."""
+
+
+def Rank2026_head(a: ArrayLike, tolerance: float) -> int:
+    """Numerical rank of a matrix of any norm: the number of singular values above the tolerance, which ..."""
+
+
+def CxRank2026_head(a: ArrayLike, tolerance: float) -> int:
+    """As Rank2026_head, for complex data. Numerical rank of a matrix of any norm: the number of ..."""
+
+
+def CondNumber2026_head(a: ArrayLike, normType: int) -> float:
+    """Condition number of a matrix of any norm."""
+
+
+def CxCondNumber2026_head(a: ArrayLike, normType: int) -> float:
+    """As CondNumber2026_head, for complex data. Condition number of a matrix of any norm."""
+
+
+def Norm2026_head(a: ArrayLike, normType: int) -> float:
+    """Norm of a matrix."""
+
+
+def CxNorm2026_head(a: ArrayLike, normType: int) -> float:
+    """As Norm2026_head, for complex data. Norm of a matrix."""
 
 
 def Trace_head(a: ArrayLike) -> float:

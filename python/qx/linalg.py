@@ -31,7 +31,6 @@ core = served("linalg")
 
 EPS = float(np.finfo(float).eps)
 WORST = 1e-4 / EPS  # the condition from which on fewer than four digits are certain
-SMALL = 48  # the order up to which an inverse costs less than an estimate of its norm
 
 
 @result
@@ -227,16 +226,6 @@ def _each(function: Any, *stacks: Any) -> Any:
     return stacked(found)
 
 
-def _near_one(a: NDArray[Any]) -> tuple[NDArray[Any], Any]:
-    """The matrix by the power of two next to its largest element, and that power. What is made of singular
-    values loses digits for matrices of a norm far below 1."""
-    largest = np.abs(a).max(initial=0)
-    if not 0 < largest < np.inf:
-        return a, 1.0
-    power = 2.0 ** math.frexp(largest)[1]
-    return (a, 1.0) if not 0 < power < np.inf else (a / power, power)
-
-
 def _sides(function: str, a: NDArray[Any], b: ArrayLike) -> tuple[NDArray[Any], bool]:
     """b as a matrix, and whether it was a vector."""
     b = as_array(b)
@@ -256,54 +245,11 @@ def _factors(function: Any, a: Any) -> Any:
     return lu, pivots
 
 
-def _solved(lu: Any, pivots: Any, columns: Any) -> Any:
-    solve_one = _served("solve", lu, columns)
-    return np.stack([solve_one(lu, pivots, column) for column in columns.T], -1)
-
-
-def _inverse_norm(lu: Any, pivots: Any) -> Any:
-    """The largest column sum of moduli of the inverse: exact for small matrices, else an estimate from
-    below (W. W. Hager, "Condition estimates", 1984)."""
-    n = len(lu)
-    if n <= SMALL:
-        return np.abs(_served("solve_inverse", lu)(lu, pivots)).sum(0).max()
-    lower, upper = np.tril(lu, -1) + np.eye(n), np.triu(lu)
-    order = np.arange(n)
-    for step, pivot in enumerate(pivots):
-        order[[step, pivot]] = order[[pivot, step]]
-
-    def transposed(v: Any) -> Any:
-        y = np.conj(_served("solve_triangular", lu)(np.ascontiguousarray(upper.T), 0, np.conj(v)[:, None]))
-        y = np.conj(_served("solve_triangular", lu)(np.ascontiguousarray(lower.T), 1, np.conj(y)))[:, 0]
-        found = np.empty_like(y)
-        found[order] = y
-        return found
-
-    x, best = np.full(n, 1 / n), 0.0
-    for _ in range(5):
-        y = _solved(lu, pivots, x[:, None].astype(lu.dtype))[:, 0]
-        best = max(best, np.abs(y).sum())
-        z = transposed(np.where(y == 0, 1, y / np.where(y == 0, 1, np.abs(y))).astype(lu.dtype))
-        at = int(np.argmax(np.abs(z)))
-        if np.abs(z[at]) <= abs(np.vdot(z, x)):
-            break
-        x = np.zeros(n)
-        x[at] = 1
-    return best
-
-
 def _warn_of(function: Any, condition: Any) -> None:
     if not condition < WORST:
         digits = max(0, math.floor(-math.log10(EPS * condition))) if condition < np.inf else 0
         warn(QxWarning(f"qx.{function}", 20006, f"qx.{function}: a is badly conditioned, {condition:.1e}: of the "
                        f"result about {digits} digits are certain"))
-
-
-def _condition(a: Any, lu: Any, pivots: Any) -> Any:
-    try:
-        return float(np.abs(a).sum(0).max() * _inverse_norm(lu, pivots))
-    except np.linalg.LinAlgError:
-        return np.inf  # what the estimate solves is singular to rounding
 
 
 ASSUMPTIONS = {"general": "general", "positive": "positive", "lower": "lower", "upper": "upper"}
@@ -353,11 +299,12 @@ def solve(a: ArrayLike, b: ArrayLike,
             return _served("solve_triangular", a, columns)(a, int(kind == "upper"), columns)
         if kind == "positive":
             return _served("solve_positive", a, columns)(a, 0, columns)
-        lu, pivots = _factors("linalg.solve", a)
-        _warn_of("linalg.solve", _condition(a, lu, pivots))
-        if columns.dtype.kind == "c" and lu.dtype.kind != "c":
-            lu = lu.astype(complex)
-        return _solved(lu, pivots, columns)
+        try:
+            (x, reciprocal), _ = keeping(_served("solve", a, columns), a, columns)
+        except np.linalg.LinAlgError:
+            refuse("linalg.solve", "a", "is singular: a pivot is 0", "ErrSingularMatrix")
+        _warn_of("linalg.solve", 1 / reciprocal if reciprocal else np.inf)
+        return x
 
     found = _each(of_one, a, columns)
     return found[..., 0] if is_vector else found
@@ -395,10 +342,9 @@ def lstsq(a: ArrayLike, b: ArrayLike, rcond: float | None = None) -> LeastSquare
     if a.ndim > 2:
         refuse("linalg.lstsq", "a", "one matrix is needed, not a stack", "ErrSizesDisagree")
     columns, is_vector = _sides("linalg.lstsq", a, b)
-    scaled, power = _near_one(a)
     limit: float = max(a.shape) * EPS if rcond is None else float(rcond)
-    x = _served("lstsq", a, columns)(scaled, columns, limit / max(a.shape)) / power
-    values = _served("svdvals", a)(scaled) * power
+    x = _served("lstsq", a, columns)(a, columns, limit / max(a.shape))
+    values = _served("svdvals", a)(a)
     rank = int(np.sum(values > limit * values.max(initial=0)))
     left = np.sum(np.abs(columns - a @ x)**2, 0)
     return LeastSquares(x[:, 0] if is_vector else x, left, rank, values)
@@ -465,10 +411,8 @@ def pinv(a: ArrayLike, rcond: float | None = None) -> NDArray[Any]:
     array([[0.5, 0.5]])
     """
     def of_one(a: Any) -> Any:
-        scaled, power = _near_one(a)
-        largest = _served("svdvals", a)(scaled).max()
-        limit = (max(a.shape) * EPS if rcond is None else rcond) * largest
-        return _served("pinv", a)(scaled, float(limit)) / power
+        limit = -1.0 if rcond is None else rcond * _served("svdvals", a)(a)[0]
+        return _served("pinv", a)(a, float(limit))
 
     return _each(of_one, _matrix("linalg.pinv", a))
 
@@ -564,10 +508,10 @@ def norm(a: ArrayLike, ord: int | float | str | None = None) -> float:
     if a.ndim == 1:
         return _served("norm_vector", a)(a, 2.0 if ord is None else float(ord))
     kind = chosen("linalg.norm", "ord", "fro" if ord is None else ord, NORMS)
-    scaled, power = _near_one(_matrix("linalg.norm", a)) if kind == 0 else (_matrix("linalg.norm", a), 1.0)
+    a = _matrix("linalg.norm", a)
     if a.ndim > 2:
         refuse("linalg.norm", "a", "one matrix is needed, not a stack", "ErrSizesDisagree")
-    return _served("norm", a)(scaled, kind) * power
+    return _served("norm", a)(a, kind)
 
 
 def cond(a: ArrayLike, p: float | Literal["fro"] | None = None) -> float:
@@ -598,7 +542,7 @@ def cond(a: ArrayLike, p: float | Literal["fro"] | None = None) -> float:
     4.0
     """
     kind = chosen("linalg.cond", "p", p, CONDITIONS)
-    return _each(lambda a: _served("cond", a)(_near_one(a)[0], kind), _matrix("linalg.cond", a, kind > 0))
+    return _each(lambda a: _served("cond", a)(a, kind), _matrix("linalg.cond", a, kind > 0))
 
 
 def matrix_rank(a: ArrayLike, rcond: float | None = None) -> int:
@@ -627,9 +571,8 @@ def matrix_rank(a: ArrayLike, rcond: float | None = None) -> int:
     1
     """
     def of_one(a: Any) -> Any:
-        scaled, _ = _near_one(a)
-        limit = (max(a.shape) * EPS if rcond is None else rcond) * _served("svdvals", a)(scaled).max()
-        return _served("matrix_rank", a)(scaled, float(limit))
+        limit = -1.0 if rcond is None else rcond * _served("svdvals", a)(a)[0]
+        return _served("matrix_rank", a)(a, float(limit))
 
     return _each(of_one, _matrix("linalg.matrix_rank", a))
 
@@ -795,9 +738,8 @@ def svd(a: ArrayLike, full_matrices: bool = True) -> SVD:
     array([4., 3.])
     """
     def of_one(a: Any) -> Any:
-        scaled, power = _near_one(a)
-        u, s, v = _served("svd", a)(scaled, int(full_matrices))
-        return SVD(u, s * power, v.conj().T)
+        u, s, v = _served("svd", a)(a, int(full_matrices))
+        return SVD(u, s, v.conj().T)
 
     return _each(of_one, _matrix("linalg.svd", a))
 
@@ -825,11 +767,7 @@ def svdvals(a: ArrayLike) -> NDArray[np.float64]:
     >>> qx.linalg.svdvals([[3.0, 0.0], [0.0, 4.0]]).round(12)
     array([4., 3.])
     """
-    def of_one(a: Any) -> Any:
-        scaled, power = _near_one(a)
-        return _served("svdvals", a)(scaled) * power
-
-    return _each(of_one, _matrix("linalg.svdvals", a))
+    return _each(lambda a: _served("svdvals", a)(a), _matrix("linalg.svdvals", a))
 
 
 def qr(a: ArrayLike, mode: Literal["reduced", "complete"] = "reduced", pivoting: bool = False) -> QR:

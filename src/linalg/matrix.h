@@ -33,6 +33,16 @@ RealMatrix PartsOf(const MatrixView<E> &a) {
             a.stride() * partsOf<E>};
 }
 
+// Whether no element is NaN or infinite; the largest finite number is as good as any other.
+template <ElementType E>
+bool HoldsOnlyNumbers(ConstMatrixView<E> a) {
+    for (int32_t i = 0; i < a.rows(); ++i)
+        for (int32_t j = 0; j < a.cols(); ++j)
+            if (!std::isfinite(RealPart(a(i, j))) || !std::isfinite(ImagPart(a(i, j))))
+                return false;
+    return true;
+}
+
 // 0, or 1 where one of n numbers is NaN or infinite. The largest finite number is refused as well,
 // and so is whatever is not above -1.7976931348623e308.
 ErrorCode CheckFinite(const DBL *x, int64_t n);

@@ -87,21 +87,21 @@ NEWEST = {
         "gsvd_complex": "CxGSVD_head",
         "is_symmetric": "CheckSym_head", "is_symmetric_complex": "CxCheckSym_head", "balance": "MatrixBalance_head",
         "balance_complex": "CxMatrixBalance_head",
-        "lu": "LU_head", "lu_complex": "CxLU_head", "solve": "LULinEqs_head", "solve_complex":
-        "CxLULinEqs_head", "solve_inverse": "LUInvMatrix_head", "solve_inverse_complex":
+        "lu": "LU_head", "lu_complex": "CxLU_head", "solve": "EqsSetByLU2026_head", "solve_complex":
+        "CxEqsSetByLU2026_head", "solve_inverse": "LUInvMatrix_head", "solve_inverse_complex":
         "CxLUInvMatrix_head", "solve_triangular": "TriEqsSetDri_head", "solve_triangular_complex":
         "CxTriEqsSetDri_head", "solve_positive": "EqsSetByCholeskyDri_head",
-        "solve_positive_complex": "CxEqsSetByCholeskyDri_head", "lstsq": "EqsSetBySVDDri82_head",
-        "lstsq_complex": "CxEqsSetBySVDDri82_head", "pinv": "PseudoInverse_head", "pinv_complex":
-        "CxPseudoInverse_head", "det": "Determinant_head", "det_complex": "CxDeterminant_head",
-        "trace": "Trace_head", "trace_complex": "CxTrace_head", "norm": "Norm_head",
-        "norm_complex": "CxNorm_head", "norm_vector": "vectorNormH", "norm_vector_complex":
-        "CxVectorNormH", "cond": "CondNumber_head", "cond_complex": "CxCondNumber_head",
-        "matrix_rank": "Rank_head", "matrix_rank_complex": "CxRank_head", "eig":
+        "solve_positive_complex": "CxEqsSetByCholeskyDri_head", "lstsq": "EqsSetBySVD2026_head",
+        "lstsq_complex": "CxEqsSetBySVD2026_head", "pinv": "PseudoInverse2026_head", "pinv_complex":
+        "CxPseudoInverse2026_head", "det": "Determinant_head", "det_complex": "CxDeterminant_head",
+        "trace": "Trace_head", "trace_complex": "CxTrace_head", "norm": "Norm2026_head",
+        "norm_complex": "CxNorm2026_head", "norm_vector": "vectorNormH", "norm_vector_complex":
+        "CxVectorNormH", "cond": "CondNumber2026_head", "cond_complex": "CxCondNumber2026_head",
+        "matrix_rank": "Rank2026_head", "matrix_rank_complex": "CxRank2026_head", "eig":
         "EigenValueVector_head", "eig_complex": "CxEigenValueVector_head", "eig_general":
         "GenEigenEx_head", "eig_general_complex": "CxGenEigenEx_head", "eigh":
-        "SymEvectorEvalue_head", "svd": "SVDEx_head", "svd_complex": "CxSVDEx_head", "svdvals":
-        "SVDS_head", "svdvals_complex": "CxSVDS_head", "qr": "QRDecH", "qr_complex": "CxQRDecH",
+        "SymEvectorEvalue_head", "svd": "SVD2026_head", "svd_complex": "CxSVD2026_head", "svdvals":
+        "SVDS2026_head", "svdvals_complex": "CxSVDS2026_head", "qr": "QRDecH", "qr_complex": "CxQRDecH",
         "cholesky": "FullCholesky_head", "cholesky_complex": "CxFullCholesky_head", "schur":
         "Schur80_head", "schur_complex": "CxSchur80_head", "qz": "QZ80_head", "qz_complex":
         "CxQZ80_head", "hessenberg": "Hessenberg_head", "hessenberg_complex": "CxHessenberg_head",

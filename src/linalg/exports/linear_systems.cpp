@@ -40,6 +40,18 @@ Outcome SolveSetLU(In<Matrix> a, In<Matrix> b, Out<Matrix> x) {
     return ErrNotAvailable;
 }
 
+template <class Matrix>
+Outcome SolveSetLU2026(In<Matrix> a, In<Matrix> b, Out<Matrix> x, OutDBL reciprocalCondition) {
+    if (const Outcome bad = FirstFailed({{a.isEmpty() || b.isEmpty(), ErrEmptyInput},
+                                         {!a.isSquare(), ErrNotSquare},
+                                         {b.rows() != a.rows(), ErrSizeMismatch}}))
+        return bad;
+    if (const Outcome bad = x.resize(a.rows(), b.cols()))
+        return bad;
+    return SolveSetByLU<elementOf<Matrix>>(a.view(), b.view(), x.view(),
+                                           reciprocalCondition.address());
+}
+
 template <class Matrix, class Vector>
 Outcome SolveWithFactors(In<Matrix> lu, In<I32_1D> pivots, InOut<Vector> b) {
     if (const Outcome bad =
@@ -89,6 +101,26 @@ Outcome SolveLeastSquaresSet(In<Matrix> a, In<Matrix> b, Out<Matrix> x, double t
     if (const Outcome bad = x.resize(a.cols(), b.cols()))
         return bad;
     return SolveBySVD<elementOf<Matrix>>(a.view(), b.view(), x.view(), tolerance);
+}
+
+template <class Matrix, class Vector>
+Outcome SolveLeastSquares2026(In<Matrix> a, In<Vector> b, Out<Vector> x, double tolerance) {
+    if (const Outcome bad = FirstFailed(
+            {{a.isEmpty() || b.isEmpty(), ErrEmptyInput}, {b.size() != a.rows(), ErrSizeMismatch}}))
+        return bad;
+    if (const Outcome bad = x.resize(a.cols()))
+        return bad;
+    return SolveScaledBySVD<elementOf<Matrix>>(a.view(), AsColumn(b.view()), AsColumn(x.view()),
+                                               tolerance);
+}
+template <class Matrix>
+Outcome SolveLeastSquaresSet2026(In<Matrix> a, In<Matrix> b, Out<Matrix> x, double tolerance) {
+    if (const Outcome bad = FirstFailed(
+            {{a.isEmpty() || b.isEmpty(), ErrEmptyInput}, {b.rows() != a.rows(), ErrSizeMismatch}}))
+        return bad;
+    if (const Outcome bad = x.resize(a.cols(), b.cols()))
+        return bad;
+    return SolveScaledBySVD<elementOf<Matrix>>(a.view(), b.view(), x.view(), tolerance);
 }
 
 // The memory that is shown, with `more` elements than the plain method needs.
@@ -266,6 +298,12 @@ ErrorCode EqsSetByLUDri_head(DBL2D a, DBL2D b, DBL2D x) {
 ErrorCode CxEqsSetByLUDri_head(CDB2D a, CDB2D b, CDB2D x) {
     return Returned(qx::SolveSetLU<CDB2D>, a, b, x);
 }
+ErrorCode EqsSetByLU2026_head(DBL2D a, DBL2D b, DBL2D x, DBL *reciprocalCondition) {
+    return Returned(qx::SolveSetLU2026<DBL2D>, a, b, x, reciprocalCondition);
+}
+ErrorCode CxEqsSetByLU2026_head(CDB2D a, CDB2D b, CDB2D x, DBL *reciprocalCondition) {
+    return Returned(qx::SolveSetLU2026<CDB2D>, a, b, x, reciprocalCondition);
+}
 int32_t LULinEqs_head(DBL2D lu, I32_1D pivots, DBL1D b, ErrorCode *err) {
     return InErr(err, qx::SolveWithFactors<DBL2D, DBL1D>, lu, pivots, b);
 }
@@ -311,6 +349,18 @@ ErrorCode EqsSetBySVDDri82_head(DBL2D a, DBL2D b, DBL2D x, double tolerance) {
 }
 ErrorCode CxEqsSetBySVDDri82_head(CDB2D a, CDB2D b, CDB2D x, double tolerance) {
     return Returned(qx::SolveLeastSquaresSet<CDB2D>, a, b, x, tolerance);
+}
+ErrorCode GenLinEqs2026_head(DBL2D a, DBL1D b, DBL1D x, double tolerance) {
+    return Returned(qx::SolveLeastSquares2026<DBL2D, DBL1D>, a, b, x, tolerance);
+}
+ErrorCode CxGenLinEqs2026_head(CDB2D a, CDB1D b, CDB1D x, double tolerance) {
+    return Returned(qx::SolveLeastSquares2026<CDB2D, CDB1D>, a, b, x, tolerance);
+}
+ErrorCode EqsSetBySVD2026_head(DBL2D a, DBL2D b, DBL2D x, double tolerance) {
+    return Returned(qx::SolveLeastSquaresSet2026<DBL2D>, a, b, x, tolerance);
+}
+ErrorCode CxEqsSetBySVD2026_head(CDB2D a, CDB2D b, CDB2D x, double tolerance) {
+    return Returned(qx::SolveLeastSquaresSet2026<CDB2D>, a, b, x, tolerance);
 }
 
 int32_t EqsByCholeskyDri_head(DBL2D a, DBL1D b, DBL1D x, ErrorCode *err) {

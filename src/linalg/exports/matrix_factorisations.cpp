@@ -196,7 +196,7 @@ Outcome SVDInPlace(InOut<Matrix> a, Out<DBL1D> s, Out<Matrix> v) {
     return SVDecompose<E>(copy, a.view(), s.view(), v.view());
 }
 
-template <class Matrix>
+template <class Matrix, SVDScaling Scaling>
 Outcome SVD(In<Matrix> a, bool full, Out<Matrix> u, Out<DBL1D> s, Out<Matrix> v) {
     if (a.isEmpty())
         return ErrEmptyInput;
@@ -208,21 +208,21 @@ Outcome SVD(In<Matrix> a, bool full, Out<Matrix> u, Out<DBL1D> s, Out<Matrix> v)
     if (const Outcome bad = v.resize(n, full ? n : k))
         return bad;
     constexpr ElementType E = elementOf<Matrix>;
-    if (!AllFinite<E>(a.view()))
+    if (!MayBeTaken<E>(a.view(), Scaling))
         return ErrNonFiniteInput;
-    return SVDecompose<E>(a.view(), u.view(), s.view(), v.view());
+    return SVDecompose<E>(a.view(), u.view(), s.view(), v.view(), Scaling);
 }
 
-template <class Matrix>
+template <class Matrix, SVDScaling Scaling>
 Outcome SVDValues(In<Matrix> a, Out<DBL1D> s) {
     if (a.isEmpty())
         return ErrEmptyInput;
     if (const Outcome bad = s.resize(std::min(a.rows(), a.cols())))
         return bad;
     constexpr ElementType E = elementOf<Matrix>;
-    if (!AllFinite<E>(a.view()))
+    if (!MayBeTaken<E>(a.view(), Scaling))
         return ErrNonFiniteInput;
-    return SingularValues<E>(a.view(), s.view());
+    return SingularValues<E>(a.view(), s.view(), Scaling);
 }
 
 bool IsNoRange(int32_t low, int32_t high, int32_t n) { return low < 1 || high < low || high > n; }
@@ -320,6 +320,8 @@ Outcome VectorsBack(int32_t job, int32_t side, int32_t low, int32_t high, In<DBL
 
 using qx::InErr;
 using qx::Returned;
+constexpr auto LargeNorms = qx::SVDScaling::LargeNorms;
+constexpr auto Always = qx::SVDScaling::Always;
 
 int32_t LU_head(DBL2D a, I32_1D pivots, int32_t *parity, ErrorCode *err) {
     return InErr(err, qx::LU<DBL2D>, a, pivots, parity);
@@ -390,17 +392,25 @@ int32_t CxSVD_head(CDB2D a, DBL1D s, CDB2D v, ErrorCode *err) {
     return InErr(err, qx::SVDInPlace<CDB2D>, a, s, v);
 }
 ErrorCode SVDEx_head(DBL2D a, int32_t fullSize, DBL2D u, DBL1D s, DBL2D v) {
-    return Returned(qx::SVD<DBL2D>, a, fullSize != 0, u, s, v);
+    return Returned(qx::SVD<DBL2D, LargeNorms>, a, fullSize != 0, u, s, v);
 }
 ErrorCode CxSVDEx_head(CDB2D a, int32_t fullSize, CDB2D u, DBL1D s, CDB2D v) {
-    return Returned(qx::SVD<CDB2D>, a, fullSize != 0, u, s, v);
+    return Returned(qx::SVD<CDB2D, LargeNorms>, a, fullSize != 0, u, s, v);
 }
 int32_t SVDS_head(DBL2D a, DBL1D s, ErrorCode *err) {
-    return InErr(err, qx::SVDValues<DBL2D>, a, s);
+    return InErr(err, qx::SVDValues<DBL2D, LargeNorms>, a, s);
 }
 int32_t CxSVDS_head(CDB2D a, DBL1D s, ErrorCode *err) {
-    return InErr(err, qx::SVDValues<CDB2D>, a, s);
+    return InErr(err, qx::SVDValues<CDB2D, LargeNorms>, a, s);
 }
+ErrorCode SVD2026_head(DBL2D a, int32_t fullSize, DBL2D u, DBL1D s, DBL2D v) {
+    return Returned(qx::SVD<DBL2D, Always>, a, fullSize != 0, u, s, v);
+}
+ErrorCode CxSVD2026_head(CDB2D a, int32_t fullSize, CDB2D u, DBL1D s, CDB2D v) {
+    return Returned(qx::SVD<CDB2D, Always>, a, fullSize != 0, u, s, v);
+}
+ErrorCode SVDS2026_head(DBL2D a, DBL1D s) { return Returned(qx::SVDValues<DBL2D, Always>, a, s); }
+ErrorCode CxSVDS2026_head(CDB2D a, DBL1D s) { return Returned(qx::SVDValues<CDB2D, Always>, a, s); }
 
 ErrorCode Hessenberg_head(DBL2D a, int32_t low, int32_t high, DBL2D q) {
     return Returned(qx::Hessenberg<DBL2D>, a, low, high, q);

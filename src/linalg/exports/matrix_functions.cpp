@@ -89,6 +89,15 @@ Outcome PseudoInverse(InOut<Matrix> a, double tolerance) {
     return 0;
 }
 
+template <class Matrix>
+Outcome PseudoInverse2026(In<Matrix> a, double tolerance, Out<Matrix> out) {
+    if (a.isEmpty())
+        return ErrEmptyInput;
+    if (const Outcome bad = out.resize(a.cols(), a.rows()))
+        return bad;
+    return ScaledPseudoInverse<elementOf<Matrix>>(a.view(), tolerance, out.view());
+}
+
 } // namespace
 } // namespace qx
 
@@ -117,4 +126,10 @@ int32_t PseudoInverse_head(DBL2D a, const double *tolerance, ErrorCode *err) {
 }
 int32_t CxPseudoInverse_head(CDB2D a, const double *tolerance, ErrorCode *err) {
     return InErr(err, qx::PseudoInverse<CDB2D>, a, *tolerance);
+}
+ErrorCode PseudoInverse2026_head(DBL2D a, double tolerance, DBL2D out) {
+    return Returned(qx::PseudoInverse2026<DBL2D>, a, tolerance, out);
+}
+ErrorCode CxPseudoInverse2026_head(CDB2D a, double tolerance, CDB2D out) {
+    return Returned(qx::PseudoInverse2026<CDB2D>, a, tolerance, out);
 }

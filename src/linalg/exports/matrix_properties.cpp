@@ -50,6 +50,25 @@ Outcome Norm(In<Matrix> a, int32_t normType, OutDBL norm) {
 }
 
 template <class Matrix>
+Outcome Rank2026(In<Matrix> a, double tolerance, OutI32 rank) {
+    if (a.isEmpty())
+        return ErrEmptyInput;
+    return ScaledRank<elementOf<Matrix>>(a.view(), tolerance, rank.address());
+}
+template <class Matrix>
+Outcome Condition2026(In<Matrix> a, int32_t normType, OutDBL cond) {
+    if (a.isEmpty())
+        return ErrEmptyInput;
+    return ScaledConditionNumber<elementOf<Matrix>>(a.view(), normType, cond.address());
+}
+template <class Matrix>
+Outcome Norm2026(In<Matrix> a, int32_t normType, OutDBL norm) {
+    if (a.isEmpty())
+        return ErrEmptyInput;
+    return ScaledNorm<elementOf<Matrix>>(a.view(), normType, norm.address());
+}
+
+template <class Matrix>
 Outcome Trace(In<Matrix> a, OutElement<Matrix> trace) {
     if (const Outcome bad = SquareLast(a))
         return bad;
@@ -171,6 +190,24 @@ int32_t Norm_head(DBL2D a, const int32_t *normType, DBL *norm, ErrorCode *err) {
 }
 int32_t CxNorm_head(CDB2D a, const int32_t *normType, DBL *norm, ErrorCode *err) {
     return InErr(err, qx::Norm<CDB2D>, a, *normType, norm);
+}
+ErrorCode Rank2026_head(DBL2D a, double tolerance, int32_t *rank) {
+    return Returned(qx::Rank2026<DBL2D>, a, tolerance, rank);
+}
+ErrorCode CxRank2026_head(CDB2D a, double tolerance, int32_t *rank) {
+    return Returned(qx::Rank2026<CDB2D>, a, tolerance, rank);
+}
+ErrorCode CondNumber2026_head(DBL2D a, int32_t normType, DBL *cond) {
+    return Returned(qx::Condition2026<DBL2D>, a, normType, cond);
+}
+ErrorCode CxCondNumber2026_head(CDB2D a, int32_t normType, DBL *cond) {
+    return Returned(qx::Condition2026<CDB2D>, a, normType, cond);
+}
+ErrorCode Norm2026_head(DBL2D a, int32_t normType, DBL *norm) {
+    return Returned(qx::Norm2026<DBL2D>, a, normType, norm);
+}
+ErrorCode CxNorm2026_head(CDB2D a, int32_t normType, DBL *norm) {
+    return Returned(qx::Norm2026<CDB2D>, a, normType, norm);
 }
 int32_t Trace_head(DBL2D a, DBL *trace, ErrorCode *err) {
     return InErr(err, qx::Trace<DBL2D>, a, trace);

@@ -19,7 +19,7 @@ class TallSVD {
     typedef Reflector<E> Reflection;
 
 public:
-    TallSVD(int32_t m, int32_t n) : m_(m), n_(n) {}
+    TallSVD(int32_t m, int32_t n, SVDScaling scaling) : m_(m), n_(n), scaling_(scaling) {}
 
     ErrorCode allocate(bool withVectors) {
         // Later the transposed factors take the place of the matrix and its right reflectors.
@@ -91,8 +91,12 @@ public:
 private:
     T *at(int32_t row) { return matrix_.row(row); }
 
-    // kept: small values are not brought up, for what is below 2.2e-16 counts as zero
-    int bringIntoRange() { return BringIntoRange<E>(matrix_, 0.0); }
+    int bringIntoRange() {
+        if (scaling_ == SVDScaling::Always)
+            return ScaleTo<E>(matrix_, 200);
+        // kept: small values are not brought up, for what is below 2.2e-16 counts as zero
+        return BringIntoRange<E>(matrix_, 0.0);
+    }
     void restoreRange(RealVector s, int exponent) const {
         for (int32_t i = 0; exponent != 0 && i < n_; ++i)
             s[i] = std::ldexp(s[i], exponent);
@@ -190,6 +194,7 @@ private:
     }
 
     int32_t m_, n_;
+    SVDScaling scaling_;
     ScratchParts memory_;
     MatrixView<E> matrix_, left_, right_; // the last two are the transposed factors
     VectorView<E> leftKappa_, rightKappa_, column_, work_, rowFactors_;
@@ -238,10 +243,10 @@ bool AreFactors(const ConstMatrixView<E> &a, const ConstMatrixView<E> &u, ConstR
 
 template <ElementType E>
 ErrorCode SVDecompose(const ConstMatrixView<E> &a, const MatrixView<E> &u, RealVector s,
-                      const MatrixView<E> &v) {
+                      const MatrixView<E> &v, SVDScaling scaling) {
     const int32_t m = a.rows(), n = a.cols();
-    QX_EXPECTS(!a.isEmpty() && AllFinite<E>(a) && AreFactors<E>(a, u, s, v));
-    TallSVD<E> svd(std::max(m, n), std::min(m, n));
+    QX_EXPECTS(!a.isEmpty() && MayBeTaken<E>(a, scaling) && AreFactors<E>(a, u, s, v));
+    TallSVD<E> svd(std::max(m, n), std::min(m, n), scaling);
     if (const ErrorCode failed = svd.allocate(true))
         return failed;
     if (m >= n) {
@@ -253,10 +258,10 @@ ErrorCode SVDecompose(const ConstMatrixView<E> &a, const MatrixView<E> &u, RealV
 }
 
 template <ElementType E>
-ErrorCode SingularValues(const ConstMatrixView<E> &a, RealVector s) {
+ErrorCode SingularValues(const ConstMatrixView<E> &a, RealVector s, SVDScaling scaling) {
     const int32_t m = a.rows(), n = a.cols();
-    QX_EXPECTS(!a.isEmpty() && AllFinite<E>(a) && s.size() == std::min(m, n));
-    TallSVD<E> svd(std::max(m, n), std::min(m, n));
+    QX_EXPECTS(!a.isEmpty() && MayBeTaken<E>(a, scaling) && s.size() == std::min(m, n));
+    TallSVD<E> svd(std::max(m, n), std::min(m, n), scaling);
     if (const ErrorCode failed = svd.allocate(false))
         return failed;
     if (m >= n)
@@ -267,10 +272,10 @@ ErrorCode SingularValues(const ConstMatrixView<E> &a, RealVector s) {
 }
 
 template ErrorCode SVDecompose(const ConstRealMatrix &, const RealMatrix &, RealVector,
-                               const RealMatrix &);
+                               const RealMatrix &, SVDScaling);
 template ErrorCode SVDecompose(const ConstComplexMatrix &, const ComplexMatrix &, RealVector,
-                               const ComplexMatrix &);
-template ErrorCode SingularValues(const ConstRealMatrix &, RealVector);
-template ErrorCode SingularValues(const ConstComplexMatrix &, RealVector);
+                               const ComplexMatrix &, SVDScaling);
+template ErrorCode SingularValues(const ConstRealMatrix &, RealVector, SVDScaling);
+template ErrorCode SingularValues(const ConstComplexMatrix &, RealVector, SVDScaling);
 
 } // namespace qx

@@ -13,14 +13,25 @@ namespace qx {
 // The error of a singular value is a few n eps times the largest one, and never less than about
 // eps itself: what is below 2.2e-16 counts as zero whatever the norm of the matrix.
 //
+// With SVDScaling::Always the matrix is brought to a norm of about 2^200 by a power of two first, so
+// that the error is a few n eps times the largest value at any norm, and 2^k a has the values 2^k s
+// and the vectors of a, to the bit.
+//
 // ErrOutOfMemory, ErrIterationLimit.
+enum class SVDScaling { LargeNorms, Always };
+// Whether the elements are finite, of which LargeNorms has a narrower notion.
+template <ElementType E>
+bool MayBeTaken(const ConstMatrixView<E> &a, SVDScaling scaling) {
+    return scaling == SVDScaling::Always ? HoldsOnlyNumbers<E>(a) : AllFinite<E>(a);
+}
 template <ElementType E>
 ErrorCode SVDecompose(const ConstMatrixView<E> &a, const MatrixView<E> &u, RealVector s,
-                      const MatrixView<E> &v);
+                      const MatrixView<E> &v, SVDScaling scaling = SVDScaling::LargeNorms);
 
 // The singular values alone, falling.
 template <ElementType E>
-ErrorCode SingularValues(const ConstMatrixView<E> &a, RealVector s);
+ErrorCode SingularValues(const ConstMatrixView<E> &a, RealVector s,
+                         SVDScaling scaling = SVDScaling::LargeNorms);
 
 } // namespace qx
 

@@ -1,6 +1,7 @@
 #include "linalg/properties/scalars.h"
 
 #include "linalg/factorisations/cholesky.h"
+#include "linalg/factorisations/range.h"
 #include "linalg/factorisations/svd.h"
 #include "linalg/systems/lu.h"
 
@@ -98,10 +99,10 @@ double Frobenius(const ConstMatrixView<E> &a) {
 // Of finite elements.
 template <ElementType E>
 struct Values {
-    ErrorCode find(const ConstMatrixView<E> &a) {
+    ErrorCode find(const ConstMatrixView<E> &a, SVDScaling scaling = SVDScaling::LargeNorms) {
         if (const ErrorCode failed = memory.take(Sized(s, std::min(a.rows(), a.cols()))))
             return failed;
-        return SingularValues<E>(a, s);
+        return SingularValues<E>(a, s, scaling);
     }
     double largest() const { return s[0]; }
     double smallest() const { return s[s.size() - 1]; }
@@ -214,6 +215,75 @@ ErrorCode MatrixRank(const ConstMatrixView<E> &a, double tolerance, int32_t *ran
     return 0;
 }
 
+template <ElementType E>
+ErrorCode ScaledNorm(const ConstMatrixView<E> &a, int32_t normType, double *norm) {
+    QX_EXPECTS(!a.isEmpty());
+    if (!HoldsOnlyNumbers<E>(a))
+        return ErrNonFiniteInput;
+    if (normType < twoNorm || normType > infinityNorm)
+        return ErrInvalidSelector;
+    ScaledCopy<E> scaled;
+    Values<E> values;
+    if (const ErrorCode failed = scaled.make(a))
+        return failed;
+    if (normType == twoNorm) {
+        if (const ErrorCode failed = values.find(scaled.matrix, SVDScaling::Always))
+            return failed;
+        *norm = values.largest();
+    } else {
+        *norm = normType == oneNorm         ? LargestColumnSum<E>(scaled.matrix)
+                : normType == frobeniusNorm ? Frobenius<E>(scaled.matrix)
+                                            : LargestRowSum<E>(scaled.matrix);
+    }
+    *norm = TimesPower(*norm, scaled.exponent);
+    return 0;
+}
+
+template <ElementType E>
+ErrorCode ScaledConditionNumber(const ConstMatrixView<E> &a, int32_t normType, double *cond) {
+    QX_EXPECTS(!a.isEmpty());
+    if (!HoldsOnlyNumbers<E>(a))
+        return ErrNonFiniteInput;
+    if (normType < twoNorm || normType > infinityNorm)
+        return ErrInvalidSelector;
+    if (normType != twoNorm && !a.isSquare())
+        return ErrNotSquare;
+    ScaledCopy<E> scaled;
+    Values<E> values;
+    if (const ErrorCode failed = scaled.make(a))
+        return failed;
+    if (normType != twoNorm)
+        return ConditionByInverse<E>(scaled.matrix, normType, cond);
+    if (const ErrorCode failed = values.find(scaled.matrix, SVDScaling::Always))
+        return failed;
+    *cond = values.smallest() == 0.0 ? infinity : values.largest() / values.smallest();
+    return 0;
+}
+
+template <ElementType E>
+ErrorCode ScaledRank(const ConstMatrixView<E> &a, double tolerance, int32_t *rank) {
+    QX_EXPECTS(!a.isEmpty());
+    if (!HoldsOnlyNumbers<E>(a))
+        return ErrNonFiniteInput;
+    ScaledCopy<E> scaled;
+    Values<E> values;
+    if (const ErrorCode failed = scaled.make(a))
+        return failed;
+    if (const ErrorCode failed = values.find(scaled.matrix, SVDScaling::Always))
+        return failed;
+    const double cut = std::max(a.rows(), a.cols()) * values.largest() * epsilon;
+    *rank = 0;
+    for (const DBL &value : values.s)
+        *rank += tolerance >= 0.0 ? TimesPower(value, scaled.exponent) > tolerance : value > cut;
+    return 0;
+}
+
+template ErrorCode ScaledNorm(const ConstRealMatrix &, int32_t, double *);
+template ErrorCode ScaledNorm(const ConstComplexMatrix &, int32_t, double *);
+template ErrorCode ScaledConditionNumber(const ConstRealMatrix &, int32_t, double *);
+template ErrorCode ScaledConditionNumber(const ConstComplexMatrix &, int32_t, double *);
+template ErrorCode ScaledRank(const ConstRealMatrix &, double, int32_t *);
+template ErrorCode ScaledRank(const ConstComplexMatrix &, double, int32_t *);
 template ErrorCode MatrixDeterminant(const ConstRealMatrix &, MatrixType, DBL *);
 template ErrorCode MatrixDeterminant(const ConstComplexMatrix &, MatrixType, CDB *);
 template ErrorCode MatrixNorm(const ConstRealMatrix &, int32_t, double *);

@@ -32,6 +32,15 @@ ErrorCode ConditionNumber(const ConstMatrixView<E> &a, int32_t normType, double 
 template <ElementType E>
 ErrorCode MatrixRank(const ConstMatrixView<E> &a, double tolerance, int32_t *rank);
 
+// The same three for matrices of any norm, which are scaled by a power of two: nothing overflows or
+// vanishes on the way. A tolerance that is not a number counts as negative.
+template <ElementType E>
+ErrorCode ScaledNorm(ConstMatrixView<E> a, int32_t normType, double *norm);
+template <ElementType E>
+ErrorCode ScaledConditionNumber(ConstMatrixView<E> a, int32_t normType, double *cond);
+template <ElementType E>
+ErrorCode ScaledRank(ConstMatrixView<E> a, double tolerance, int32_t *rank);
+
 } // namespace qx
 
 #endif

@@ -76,6 +76,23 @@ Recipe LeastSquaresSet(const std::string &name, Export solve) {
             },
             None, sizes};
 }
+template <ElementType E, class Export>
+Recipe LeastSquares2026(const std::string &name, Export solve) {
+    return {name,
+            [=](Call &c) {
+                return solve(c.in2D<E>(0, c.n + 3, c.n), c.in<E>(1, c.n + 3), c.out<E>(0), 0.0);
+            },
+            None, sizes};
+}
+template <ElementType E, class Export>
+Recipe SolveSet2026(const std::string &name, Export solve) {
+    return {name,
+            [=](Call &c) {
+                return solve(c.in2D<E>(0, c.n, c.n), c.in2D<E>(1, c.n, c.n + 2), c.out2D<E>(0),
+                             c.scalar(0));
+            },
+            None, sizes};
+}
 Recipe ShowingWork(const std::string &name, int32_t rows, int32_t refinements) {
     return {name,
             [=](Call &c) {
@@ -174,6 +191,12 @@ std::vector<Recipe> LinearSystemRecipes() {
         ShowingWork("GenLinEqsbySVD2011_head: tall, plain", 5, 0),
         ShowingWork("GenLinEqsbySVD2011_head: tall, refined", 5, 2),
         ShowingWork("GenLinEqsbySVD2011_head: wide, refined", 0, 2),
+        LeastSquares2026<DBL>("GenLinEqs2026_head", ::GenLinEqs2026_head),
+        LeastSquares2026<CDB>("CxGenLinEqs2026_head", ::CxGenLinEqs2026_head),
+        SolveSet2026<DBL>("EqsSetByLU2026_head", ::EqsSetByLU2026_head),
+        SolveSet2026<CDB>("CxEqsSetByLU2026_head", ::CxEqsSetByLU2026_head),
+        LeastSquaresSet<DBL>("EqsSetBySVD2026_head", WithLast(::EqsSetBySVD2026_head, 0.0)),
+        LeastSquaresSet<CDB>("CxEqsSetBySVD2026_head", WithLast(::CxEqsSetBySVD2026_head, 0.0)),
         LeastSquaresSet<DBL>("EqsSetBySVDDri_head", ::EqsSetBySVDDri_head),
         LeastSquaresSet<CDB>("CxEqsSetBySVDDri_head", ::CxEqsSetBySVDDri_head),
         LeastSquaresSet<DBL>("EqsSetBySVDDri82_head", WithLast(::EqsSetBySVDDri82_head, 0.1)),

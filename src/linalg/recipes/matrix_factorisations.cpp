@@ -99,6 +99,11 @@ Recipe SVDS(const char *name, Export svd) {
             None, sizes};
 }
 template <ElementType Code, class Export>
+Recipe SVDS2026(const char *name, Export svd) {
+    return {name, [svd](Call &c) { return svd(c.in2D<Code>(0, c.n + 2, c.n), c.out<DBL>(0)); },
+            None, sizes};
+}
+template <ElementType Code, class Export>
 Recipe Hessenberg(const char *name, Export reduce) {
     return {name,
             [reduce](Call &c) {
@@ -150,6 +155,8 @@ std::vector<Recipe> FactorisationRecipes() {
         SVD<CDB>("CxSVD_head", CxSVD_head),
         SVDS<DBL>("SVDS_head", SVDS_head),
         SVDS<CDB>("CxSVDS_head", CxSVDS_head),
+        SVDS2026<DBL>("SVDS2026_head", SVDS2026_head),
+        SVDS2026<CDB>("CxSVDS2026_head", CxSVDS2026_head),
         Hessenberg<DBL>("Hessenberg_head", Hessenberg_head),
         Hessenberg<CDB>("CxHessenberg_head", CxHessenberg_head),
     };
@@ -159,6 +166,8 @@ std::vector<Recipe> FactorisationRecipes() {
             OnTriangle<CDB>("CxInvMatrixTriDri_head", selector, CxInvMatrixTriDri_head));
         recipes.push_back(SVDEx<DBL>("SVDEx_head", selector, SVDEx_head));
         recipes.push_back(SVDEx<CDB>("CxSVDEx_head", selector, CxSVDEx_head));
+        recipes.push_back(SVDEx<DBL>("SVD2026_head", selector, SVD2026_head));
+        recipes.push_back(SVDEx<CDB>("CxSVD2026_head", selector, CxSVD2026_head));
         recipes.push_back(VectorsBack<DBL>("EigenVBack_head", selector, EigenVBack_head));
         recipes.push_back(VectorsBack<CDB>("CxEigenVBack_head", selector, CxEigenVBack_head));
     }

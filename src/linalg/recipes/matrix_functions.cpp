@@ -33,6 +33,15 @@ Recipe PseudoInverse(const char *name, Export function) {
             None, sizes};
 }
 
+template <ElementType Code, class Export>
+Recipe PseudoInverse2026(const char *name, Export function) {
+    return {name,
+            [function](Call &c) {
+                return function(c.in2D<Code>(0, c.n, c.n + 2), -1.0, c.out2D<Code>(0));
+            },
+            None, sizes};
+}
+
 std::vector<Recipe> FunctionRecipes() {
     std::vector<Recipe> recipes = {
         InPlace<DBL>("MatrixExp_head", MatrixExp_head),
@@ -51,6 +60,8 @@ std::vector<Recipe> FunctionRecipes() {
         InPlace<CDB>("CxMatrixSqrt_head", CxMatrixSqrt_head),
         PseudoInverse<DBL>("PseudoInverse_head", PseudoInverse_head),
         PseudoInverse<CDB>("CxPseudoInverse_head", CxPseudoInverse_head),
+        PseudoInverse2026<DBL>("PseudoInverse2026_head", PseudoInverse2026_head),
+        PseudoInverse2026<CDB>("CxPseudoInverse2026_head", CxPseudoInverse2026_head),
     };
     for (const int32_t power : {-2, 0, 5}) {
         recipes.push_back(Power<DBL>("MatrixPower_head", power, MatrixPower_head));

@@ -62,6 +62,16 @@ Recipe OfNormType(const std::string &name, int32_t type, Export norm) {
             None, sizes};
 }
 template <ElementType E, class Export>
+Recipe Rank2026(const std::string &name, Export rank) {
+    return {name, [=](Call &c) { return rank(c.in2D<E>(0, c.n, c.n + 1), -1.0, c.integer(0)); },
+            None, sizes};
+}
+template <ElementType E, class Export>
+Recipe OfNormType2026(const std::string &name, int32_t type, Export norm) {
+    return {name + ": type " + std::to_string(type),
+            [=](Call &c) { return norm(c.in2D<E>(0, c.n, c.n), type, c.scalar(0)); }, None, sizes};
+}
+template <ElementType E, class Export>
 Recipe Trace(const std::string &name, Export trace) {
     return {name, [=](Call &c) { return trace(c.in2D<E>(0, c.n, c.n), Scalar<E>(c, 0), c.err()); },
             None, sizes};
@@ -107,7 +117,7 @@ Recipe Polynomial(const std::string &name, Export polynomial) {
 }
 
 std::vector<Recipe> MatrixPropertyRecipes() {
-    return {
+    std::vector<Recipe> recipes = {
         Determinant<DBL>("Determinant_head", 0, Determinant_head),
         Determinant<CDB>("CxDeterminant_head", 0, CxDeterminant_head),
         OfNormType<DBL>("CondNumber_head", 0, CondNumber_head),
@@ -171,6 +181,16 @@ std::vector<Recipe> MatrixPropertyRecipes() {
         Polynomial<DBL>("MatrixCharacteristicPoly_head", MatrixCharacteristicPoly_head),
         Polynomial<CDB>("CxMatrixCharacteristicPoly_head", CxMatrixCharacteristicPoly_head),
     };
+    recipes.push_back(Rank2026<DBL>("Rank2026_head", Rank2026_head));
+    recipes.push_back(Rank2026<CDB>("CxRank2026_head", CxRank2026_head));
+    for (const int32_t type : {0, 1, 2, 3}) {
+        recipes.push_back(OfNormType2026<DBL>("CondNumber2026_head", type, CondNumber2026_head));
+        recipes.push_back(
+            OfNormType2026<CDB>("CxCondNumber2026_head", type, CxCondNumber2026_head));
+        recipes.push_back(OfNormType2026<DBL>("Norm2026_head", type, Norm2026_head));
+        recipes.push_back(OfNormType2026<CDB>("CxNorm2026_head", type, CxNorm2026_head));
+    }
+    return recipes;
 }
 
 const RecipeFile file(MatrixPropertyRecipes);

@@ -1,5 +1,6 @@
 #include "linalg/systems/least_squares.h"
 
+#include "linalg/factorisations/range.h"
 #include "linalg/factorisations/svd.h"
 #include "linalg/products/products.h"
 
@@ -41,12 +42,12 @@ double OrEpsilon(double tolerance) { return tolerance <= 0.0 ? epsilon : toleran
 // The decomposition in scratch memory, with U^H beside U.
 template <ElementType E>
 struct OwnDecomposition : Decomposition<E> {
-    ErrorCode make(const ConstMatrixView<E> &a) {
+    ErrorCode make(const ConstMatrixView<E> &a, SVDScaling scaling = SVDScaling::LargeNorms) {
         const int32_t m = a.rows(), n = a.cols(), k = std::min(m, n);
         if (const ErrorCode failed = memory.take(Sized(this->u, m, k), Sized(this->s, k),
                                                  Sized(this->v, n, k), Sized(adjoint, k, m)))
             return failed;
-        if (const ErrorCode failed = SVDecompose<E>(a, this->u, this->s, this->v))
+        if (const ErrorCode failed = SVDecompose<E>(a, this->u, this->s, this->v, scaling))
             return failed;
         CopyTransposed<E>(this->u, adjoint);
         for (ElementOf<E> &element : adjoint.elements())
@@ -190,6 +191,71 @@ ErrorCode SolveBySVDRefined(RealVector work, const ConstRealMatrix &a, ConstReal
     return status;
 }
 
+template <ElementType E>
+ErrorCode SolveScaledBySVD(const ConstMatrixView<E> &a, const ConstMatrixView<E> &b,
+                           const MatrixView<E> &x, double tolerance) {
+    QX_EXPECTS(b.rows() == a.rows() && x.rows() == a.cols() && x.cols() == b.cols());
+    if (!HoldsOnlyNumbers<E>(a) || !HoldsOnlyNumbers<E>(b))
+        return ErrNonFiniteInput;
+    const int32_t k = std::min(a.rows(), a.cols());
+    ScaledCopy<E> scaled;
+    OwnDecomposition<E> svd;
+    ScaledColumns<E> sides;
+    MatrixView<E> product;
+    ScratchParts memory;
+    if (const ErrorCode failed = scaled.make(a))
+        return failed;
+    if (const ErrorCode failed = svd.make(scaled.matrix, SVDScaling::Always))
+        return failed;
+    if (const ErrorCode failed = sides.make(b))
+        return failed;
+    if (const ErrorCode failed = memory.take(Sized(product, k, b.cols())))
+        return failed;
+    OrderedProduct<E>(svd.adjoint, sides.matrix, product);
+    const double cut = svd.cutAt(tolerance >= 0.0 ? tolerance : epsilon);
+    ErrorCode status = 0;
+    for (int32_t i = 0; i < k; ++i) {
+        const bool isUsed = svd.s[i] > cut;
+        status = isUsed ? status : WarnRankDeficient;
+        for (int32_t j = 0; j < b.cols(); ++j)
+            product(i, j) = isUsed ? product(i, j) / svd.s[i] : ScalarOf<E>::Of(0.0);
+    }
+    OrderedProduct<E>(svd.v, product, x);
+    sides.scaleBack(x, scaled.exponent);
+    return status;
+}
+
+template <ElementType E>
+ErrorCode ScaledPseudoInverse(const ConstMatrixView<E> &a, double tolerance,
+                              const MatrixView<E> &out) {
+    QX_EXPECTS(out.rows() == a.cols() && out.cols() == a.rows());
+    if (!HoldsOnlyNumbers<E>(a))
+        return ErrNonFiniteInput;
+    ScaledCopy<E> scaled;
+    OwnDecomposition<E> svd;
+    if (const ErrorCode failed = scaled.make(a))
+        return failed;
+    if (const ErrorCode failed = svd.make(scaled.matrix, SVDScaling::Always))
+        return failed;
+    const double cut = svd.cutAt(epsilon);
+    for (int32_t i = 0; i < svd.s.size(); ++i) {
+        const double s = svd.s[i];
+        const bool isUsed = tolerance >= 0.0 ? TimesPower(s, scaled.exponent) > tolerance : s > cut;
+        for (int32_t row = 0; row < svd.v.rows(); ++row)
+            svd.v(row, i) = isUsed ? svd.v(row, i) / s : ScalarOf<E>::Of(0.0);
+    }
+    OrderedProduct<E>(svd.v, svd.adjoint, out);
+    for (ElementOf<E> &element : out.elements())
+        element = TimesPower(element, -scaled.exponent);
+    return 0;
+}
+
+template ErrorCode SolveScaledBySVD(const ConstRealMatrix &, const ConstRealMatrix &,
+                                    const RealMatrix &, double);
+template ErrorCode SolveScaledBySVD(const ConstComplexMatrix &, const ConstComplexMatrix &,
+                                    const ComplexMatrix &, double);
+template ErrorCode ScaledPseudoInverse(const ConstRealMatrix &, double, const RealMatrix &);
+template ErrorCode ScaledPseudoInverse(const ConstComplexMatrix &, double, const ComplexMatrix &);
 template ErrorCode SolveBySVD(const ConstRealMatrix &, const ConstRealMatrix &, const RealMatrix &,
                               double);
 template ErrorCode SolveBySVD(const ConstComplexMatrix &, const ConstComplexMatrix &,

@@ -35,6 +35,16 @@ template <ElementType E>
 ErrorCode PseudoInverseMatrix(const ConstMatrixView<E> &a, double tolerance,
                               const MatrixView<E> &out);
 
+// SolveBySVD and PseudoInverseMatrix for matrices of any norm: a and each column of b are scaled by
+// powers of two, and the results are scaled back, so that 2^j a has the same digits. What overflows
+// is infinite. A tolerance below 0 or NaN is the machine epsilon for SolveScaledBySVD, and one of 0
+// stays. `out` may not take the place of a.
+template <ElementType E>
+ErrorCode SolveScaledBySVD(ConstMatrixView<E> a, ConstMatrixView<E> b, MatrixView<E> x,
+                           double tolerance);
+template <ElementType E>
+ErrorCode ScaledPseudoInverse(ConstMatrixView<E> a, double tolerance, MatrixView<E> out);
+
 } // namespace qx
 
 #endif

@@ -1,6 +1,8 @@
 #include "linalg/systems/lu.h"
 
+#include "linalg/factorisations/range.h"
 #include "linalg/products/products.h"
+#include "linalg/properties/norm_estimate.h"
 #include "linalg/systems/substitution.h"
 
 namespace qx {
@@ -163,6 +165,48 @@ ErrorCode Invert(const ConstMatrixView<E> &lu, ConstIndexVector pivots, const Ma
     return LUSolve<E>(lu, pivots, out, out);
 }
 
+// x becomes a^-H x, from the factors of P a = L U.
+template <ElementType E>
+void SolveAdjoint(const ConstMatrixView<E> &lu, ConstIndexVector pivots, VectorView<E> x) {
+    const int32_t n = lu.rows();
+    for (int32_t i = 0; i < n; ++i) {
+        x[i] = x[i] / Conj(lu(i, i));
+        for (int32_t j = i + 1; j < n; ++j)
+            x[j] = x[j] - Conj(lu(i, j)) * x[i];
+    }
+    for (int32_t i = n - 1; i > 0; --i)
+        for (int32_t j = 0; j < i; ++j)
+            x[j] = x[j] - Conj(lu(i, j)) * x[i];
+    for (int32_t k = n - 1; k >= 0; --k)
+        Swap(&x[k], &x[pivots[k]]);
+}
+
+template <ElementType E>
+ErrorCode ReciprocalCondition(double norm, const ConstMatrixView<E> &lu, ConstIndexVector pivots,
+                              double *reciprocal) {
+    VectorView<E> x;
+    ScratchParts memory;
+    if (const ErrorCode failed = memory.take(Sized(x, lu.rows())))
+        return failed;
+    const double inverseNorm = EstimateOneNorm<E>(
+        x, [&](VectorView<E> v) { LUSolve<E>(lu, pivots, AsColumn(v), AsColumn(v)); },
+        [&](VectorView<E> v) { SolveAdjoint<E>(lu, pivots, v); });
+    *reciprocal = 1.0 / norm / inverseNorm;
+    return 0;
+}
+
+template <ElementType E>
+double OneNorm(const ConstMatrixView<E> &a) {
+    double largest = 0.0;
+    for (int32_t j = 0; j < a.cols(); ++j) {
+        double sum = 0.0;
+        for (int32_t i = 0; i < a.rows(); ++i)
+            sum += Modulus(a(i, j));
+        largest = std::max(largest, sum);
+    }
+    return largest;
+}
+
 } // namespace
 
 template <ElementType E>
@@ -194,6 +238,36 @@ ErrorCode SolveByLU(const ConstMatrixView<E> &a, ConstVectorView<E> b, VectorVie
 }
 
 template <ElementType E>
+ErrorCode SolveSetByLU(const ConstMatrixView<E> &a, const ConstMatrixView<E> &b,
+                       const MatrixView<E> &x, double *reciprocalCondition) {
+    if (!HoldsOnlyNumbers<E>(a) || !HoldsOnlyNumbers<E>(b))
+        return ErrNonFiniteInput;
+    const int32_t n = a.rows();
+    ScaledCopy<E> scaled;
+    ScaledColumns<E> sides;
+    IndexVector pivots;
+    ScratchParts memory;
+    if (const ErrorCode failed = scaled.make(a))
+        return failed;
+    if (const ErrorCode failed = sides.make(b))
+        return failed;
+    if (const ErrorCode failed = memory.take(Sized(pivots, n)))
+        return failed;
+    const double norm = OneNorm<E>(scaled.matrix);
+    int32_t parity;
+    if (LUDecompose<E>(scaled.matrix, pivots, &parity) != 0)
+        return ErrSingularMatrix;
+    if (const ErrorCode failed =
+            ReciprocalCondition<E>(norm, scaled.matrix, pivots, reciprocalCondition))
+        return failed;
+    if (const ErrorCode failed = LUSolve<E>(scaled.matrix, pivots, sides.matrix, sides.matrix))
+        return failed;
+    CopyMatrix<E>(sides.matrix, x);
+    sides.scaleBack(x, scaled.exponent);
+    return *reciprocalCondition < epsilon ? WarnLowAccuracy : 0;
+}
+
+template <ElementType E>
 ErrorCode InvertByLU(const ConstMatrixView<E> &a, const MatrixView<E> &out) {
     FactoredCopy<E> factored;
     if (const ErrorCode failed = factored.make(a))
@@ -219,6 +293,10 @@ template ErrorCode LUSolve(const ConstComplexMatrix &, ConstIndexVector, const C
                            const ComplexMatrix &);
 template ErrorCode SolveByLU(const ConstRealMatrix &, ConstRealVector, RealVector);
 template ErrorCode SolveByLU(const ConstComplexMatrix &, ConstComplexVector, ComplexVector);
+template ErrorCode SolveSetByLU(const ConstRealMatrix &, const ConstRealMatrix &,
+                                const RealMatrix &, double *);
+template ErrorCode SolveSetByLU(const ConstComplexMatrix &, const ConstComplexMatrix &,
+                                const ComplexMatrix &, double *);
 template ErrorCode InvertByLU(const ConstRealMatrix &, const RealMatrix &);
 template ErrorCode InvertByLU(const ConstComplexMatrix &, const ComplexMatrix &);
 template ErrorCode InvertFactors(const RealMatrix &, ConstIndexVector);

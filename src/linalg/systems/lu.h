@@ -26,6 +26,15 @@ ErrorCode LUSolve(const ConstMatrixView<E> &lu, ConstIndexVector pivots,
 template <ElementType E>
 ErrorCode SolveByLU(const ConstMatrixView<E> &a, ConstVectorView<E> b, VectorView<E> x);
 
+// a x = b for all columns of b, of any size: a and each column are scaled by powers of two, and the
+// solutions are scaled back. *reciprocalCondition is 1 / (|a| |a^-1|) in the 1-norm, with an
+// estimate of the second factor that is seldom too small by more than a factor of 3. x may be b.
+// ErrNonFiniteInput, ErrOutOfMemory, ErrSingularMatrix; WarnLowAccuracy where the reciprocal is
+// below eps.
+template <ElementType E>
+ErrorCode SolveSetByLU(ConstMatrixView<E> a, ConstMatrixView<E> b, MatrixView<E> x,
+                       double *reciprocalCondition);
+
 // The inverse; out may be a. ErrOutOfMemory, ErrSingularMatrix.
 template <ElementType E>
 ErrorCode InvertByLU(const ConstMatrixView<E> &a, const MatrixView<E> &out);

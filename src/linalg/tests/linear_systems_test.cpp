@@ -27,6 +27,7 @@ using qx::test::Exact;
 using qx::test::ExpectLeastSquares;
 using qx::test::ExpectPseudoInverse;
 using qx::test::Reals;
+using qx::test::Scaled;
 using qx::test::View;
 
 typedef qx::test::Array1D<ElementType::DBL> DBLVector;
@@ -128,6 +129,75 @@ TEST(LU, TellsSingularityAndGoesOn) {
     EXPECT_EQ(pivots[0], 1);
 }
 
+ErrorCode SolveSet(const DBLMatrix &a, const DBLMatrix &b, DBLMatrix &x, double *reciprocal) {
+    return EqsSetByLU2026_head(a.handle(), b.handle(), x.handle(), reciprocal);
+}
+ErrorCode SolveSet(const CDBMatrix &a, const CDBMatrix &b, CDBMatrix &x, double *reciprocal) {
+    return CxEqsSetByLU2026_head(a.handle(), b.handle(), x.handle(), reciprocal);
+}
+double OneNorm(const Exact &a) {
+    long double largest = 0;
+    for (int j = 0; j < a.cols(); ++j) {
+        long double sum = 0;
+        for (int i = 0; i < a.rows(); ++i)
+            sum += std::abs(a(i, j));
+        largest = std::max(largest, sum);
+    }
+    return static_cast<double>(largest);
+}
+
+// Two right sides; the estimate is held against the norm of the inverse where that has digits.
+template <class Elements>
+void ExpectSolvedSet(const Elements &a, int n, const Elements &b) {
+    constexpr ElementType E = elementIn<Elements>;
+    const auto given = qx::test::Matrix(n, n, a), sides = qx::test::Matrix(n, 2, b);
+    auto x = qx::test::Matrix(0, 0, Elements());
+    double reciprocal = 7;
+    const ErrorCode status = SolveSet(given, sides, x, &reciprocal);
+    ASSERT_TRUE(status == 0 || status == WarnLowAccuracy || status == ErrSingularMatrix) << status;
+    if (status == ErrSingularMatrix) {
+        EXPECT_TRUE(std::isnan(reciprocal));
+        return;
+    }
+    EXPECT_EQ(status == WarnLowAccuracy, reciprocal < 0x1p-52);
+    if (std::isfinite(static_cast<double>(Exact(n, 2, x.data()).norm()))) {
+        EXPECT_LT(BackwardError(a, n, b, x.values()), 4.0);
+    }
+    Elements inverse(a.size());
+    ASSERT_EQ(qx::InvertByLU<E>(View(a, n, n), View(inverse, n, n)), 0);
+    const double exact =
+        1.0 / OneNorm(Exact(n, n, a.data())) / OneNorm(Exact(n, n, inverse.data()));
+    if (exact > 1e-10) {
+        EXPECT_GE(reciprocal, exact * (1 - 1e-5));
+        EXPECT_LE(reciprocal, exact * 3);
+    }
+    // The digits do not depend on the size; each column has its own.
+    if (OneNorm(Exact(n, n, a.data())) < 0x1p60) {
+        Elements bits = Scaled(b, 300);
+        for (int i = 0; i < n; ++i)
+            bits[2 * i] = b[2 * i];
+        auto again = qx::test::Matrix(0, 0, Elements());
+        double same = 7;
+        SolveSet(qx::test::Matrix(n, n, Scaled(a, -700)), qx::test::Matrix(n, 2, bits), again,
+                 &same);
+        EXPECT_EQ(same, reciprocal);
+        const Exact X(n, 2, x.data()), Y(n, 2, again.data());
+        for (int i = 0; i < n; ++i)
+            for (int j = 0; j < 2; ++j)
+                if (std::abs(X(i, j)) < 0x1p20L) {
+                    EXPECT_EQ(Y(i, j), X(i, j) * std::ldexp(1.0L, j == 0 ? 700 : 1000));
+                }
+    }
+}
+TEST(LU, SolvesForAllRightSidesAndEstimatesTheCondition) {
+    for (const auto &kind : qx::test::MatrixKinds())
+        for (const int n : {1, 2, 5, 33, 64}) {
+            SCOPED_TRACE(testing::Message() << kind.name << " " << n);
+            ExpectSolvedSet(RealMatrix(kind, n, n), n, Reals(2 * n, 5));
+            ExpectSolvedSet(ComplexMatrix(kind, n, n), n, Complexes(2 * n, 5));
+        }
+}
+
 TEST(LinearSystems, TheLastFailedCheckDecidesInOlderExports) {
     ErrorCode err;
     DBLMatrix a(2, 3);
@@ -184,6 +254,45 @@ TEST(LeastSquares, SatisfyTheNormalEquations) {
             qx::PseudoInverseMatrix<ElementType::DBL>(View(a, m, n), -1.0, View(pseudo, n, m)), 0);
         ExpectPseudoInverse(Exact(m, n, a.data()), Exact(n, m, pseudo.data()));
     }
+}
+
+// A well-conditioned system in units in which its numbers are tiny or huge.
+TEST(LeastSquares, OfTheRevisionsKeepTheirDigitsAtAnyNorm) {
+    for (const auto &[m, n] : {std::pair(7, 3), {3, 7}, {40, 40}, {1, 1}})
+        for (const int power : {-1000, -60, -33, 0, 900}) {
+            SCOPED_TRACE(testing::Message() << m << " by " << n << ", 2^" << power);
+            const auto a = Reals(m * n, 1), b = Reals(m, 2);
+            const auto za = Complexes(m * n, 1), zb = Complexes(m, 2);
+            const auto back = [power](const auto &x) { return Scaled(x, power); };
+            DBLMatrix x(0, 0);
+            CDBMatrix zx(0, 0);
+            DBLVector column(0);
+            CDBVector zcolumn(0);
+            ASSERT_EQ(EqsSetBySVD2026_head(DBLMatrix(m, n, Scaled(a, power)).handle(),
+                                           DBLMatrix(m, 1, b).handle(), x.handle(), -1.0),
+                      0);
+            ExpectLeastSquares(a, m, n, b, back(x.values()));
+            ASSERT_EQ(GenLinEqs2026_head(DBLMatrix(m, n, Scaled(a, power)).handle(),
+                                         DBLVector(b).handle(), column.handle(), -1.0),
+                      0);
+            EXPECT_EQ(column.values(), x.values());
+            ASSERT_EQ(CxEqsSetBySVD2026_head(CDBMatrix(m, n, Scaled(za, power)).handle(),
+                                             CDBMatrix(m, 1, zb).handle(), zx.handle(), -1.0),
+                      0);
+            ExpectLeastSquares(za, m, n, zb, back(zx.values()));
+            ASSERT_EQ(CxGenLinEqs2026_head(CDBMatrix(m, n, Scaled(za, power)).handle(),
+                                           CDBVector(zb).handle(), zcolumn.handle(), -1.0),
+                      0);
+            EXPECT_EQ(zcolumn[n - 1].im, zx.values()[n - 1].im);
+        }
+    // The tolerance is relative, and one of 0 leaves nothing out that is not 0.
+    const DBLMatrix a(2, 2, {1e-200, 0, 0, 1e-218});
+    const DBLVector b({1, 1});
+    DBLVector x(0);
+    EXPECT_EQ(GenLinEqs2026_head(a.handle(), b.handle(), x.handle(), -1.0), WarnRankDeficient);
+    EXPECT_EQ(x[1], 0.0);
+    EXPECT_EQ(GenLinEqs2026_head(a.handle(), b.handle(), x.handle(), 0.0), 0);
+    EXPECT_DOUBLE_EQ(x[1], 1e218);
 }
 
 // x + y = 2, twice: of all solutions (1, 1) is the shortest.

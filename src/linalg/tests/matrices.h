@@ -112,6 +112,18 @@ inline std::vector<CDB> ComplexMatrix(const MatrixKind &kind, int m, int n) {
     return a;
 }
 
+// a 2^power.
+inline std::vector<double> Scaled(std::vector<double> a, int power) {
+    for (double &x : a)
+        x = std::ldexp(x, power);
+    return a;
+}
+inline std::vector<CDB> Scaled(std::vector<CDB> a, int power) {
+    for (CDB &x : a)
+        x = {std::ldexp(x.re, power), std::ldexp(x.im, power)};
+    return a;
+}
+
 } // namespace qx::test
 
 #endif

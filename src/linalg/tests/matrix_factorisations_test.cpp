@@ -31,6 +31,7 @@ using qx::test::Matrix;
 using qx::test::MatrixKind;
 using qx::test::MatrixKinds;
 using qx::test::RealMatrix;
+using qx::test::Scaled;
 using qx::test::Vector;
 using qx::test::View;
 
@@ -85,6 +86,47 @@ TEST(SingularValueDecomposition, TakesWhatLiesBelowEpsilonForZero) {
     std::vector<double> s(2);
     ASSERT_EQ(qx::SingularValues<qx::ElementType::DBL>(View(a, 2, 2), View(s)), 0);
     EXPECT_NEAR(s[0], std::sqrt(5.0) * 1e-17, 1e-31);
+}
+
+ErrorCode SVD2026(const DBL2DArray &a, DBL2DArray &u, DBLArray &s, DBL2DArray &v) {
+    return SVD2026_head(a.handle(), 0, u.handle(), s.handle(), v.handle());
+}
+ErrorCode SVD2026(const CDB2DArray &a, CDB2DArray &u, DBLArray &s, CDB2DArray &v) {
+    return CxSVD2026_head(a.handle(), 0, u.handle(), s.handle(), v.handle());
+}
+ErrorCode Values2026(const DBL2DArray &a, DBLArray &s) {
+    return SVDS2026_head(a.handle(), s.handle());
+}
+ErrorCode Values2026(const CDB2DArray &a, DBLArray &s) {
+    return CxSVDS2026_head(a.handle(), s.handle());
+}
+
+TEST(SingularValueDecomposition, OfTheRevisionHasTheSameDigitsAtAnyNorm) {
+    ForEveryMatrix([](const auto &a, int m, int n) {
+        const auto given = Matrix(m, n, a);
+        std::decay_t<decltype(given)> scaledU, scaledV, u, v;
+        DBLArray s, scaledS;
+        ASSERT_EQ(SVD2026(given, scaledU, s, scaledV), 0);
+        const Exact U = Contents(scaledU), V = Contents(scaledV);
+        EXPECT_LT(FromUnitary(U), 8.0);
+        EXPECT_LT(FromUnitary(V), 8.0);
+        EXPECT_LT(
+            Deviation(U * Exact::Diagonal(std::min(m, n), s.data()) * V.adjoint(), Contents(given)),
+            4.0);
+        // Down to where the smallest elements of the kinds are still normal numbers.
+        const double largest = static_cast<double>(Contents(given).norm());
+        for (const int power : {-900, -60, 20, 900}) {
+            if (!(std::ldexp(largest, power) < 0x1p1020) || largest > 0x1p60 * (power < 0))
+                continue;
+            const auto scaled = Matrix(m, n, Scaled(a, power));
+            ASSERT_EQ(SVD2026(scaled, u, scaledS, v), 0);
+            EXPECT_EQ(scaledS.values(), Scaled(s.values(), power)) << power;
+            EXPECT_EQ((Contents(u) - U).norm(), 0.0L);
+            EXPECT_EQ((Contents(v) - V).norm(), 0.0L);
+            ASSERT_EQ(Values2026(scaled, scaledS), 0);
+            EXPECT_EQ(scaledS.values(), Scaled(s.values(), power)) << power;
+        }
+    });
 }
 
 TEST(QRDecomposition, GivesTheMatrixBackFromAUnitaryAndATriangularFactor) {

@@ -27,6 +27,7 @@ using qx::test::Matrix;
 using qx::test::MatrixKinds;
 using qx::test::RealMatrix;
 using qx::test::RelativeDeviation;
+using qx::test::Scaled;
 using qx::test::TestData;
 
 struct Case {
@@ -250,6 +251,34 @@ TEST(PseudoInverse, MeetsItsFourConditions) {
             ExpectInverted(RealMatrix(MatrixKinds()[kind], m, n), m, n, PseudoInverse_head);
             ExpectInverted(ComplexMatrix(MatrixKinds()[kind], m, n), m, n, CxPseudoInverse_head);
         }
+}
+TEST(PseudoInverse, OfTheRevisionMeetsThemAtAnyNorm) {
+    for (const auto &[m, n] : {std::pair{1, 1}, {4, 4}, {7, 3}, {3, 7}, {20, 12}})
+        for (const int kind : {0, 2, 4, 10})
+            for (const int power : {-900, -50, 0, 900}) {
+                SCOPED_TRACE(testing::Message() << m << " by " << n << ' '
+                                                << MatrixKinds()[kind].name << ", 2^" << power);
+                const auto a = RealMatrix(MatrixKinds()[kind], m, n);
+                const auto z = ComplexMatrix(MatrixKinds()[kind], m, n);
+                DBL2DArray out;
+                CDB2DArray zout;
+                ASSERT_EQ(PseudoInverse2026_head(Matrix(m, n, Scaled(a, power)).handle(), -1.0,
+                                                 out.handle()),
+                          0);
+                ExpectPseudoInverse(Exact(m, n, a.data()),
+                                    Exact(n, m, Scaled(out.values(), power).data()));
+                ASSERT_EQ(CxPseudoInverse2026_head(Matrix(m, n, Scaled(z, power)).handle(), -1.0,
+                                                   zout.handle()),
+                          0);
+                ExpectPseudoInverse(Exact(m, n, z.data()),
+                                    Exact(n, m, Scaled(zout.values(), power).data()));
+            }
+    DBL2DArray out;
+    const DBL2DArray a(2, 2, {1e-200, 0.0, 0.0, 1e-214});
+    for (const auto &[tolerance, expected] : {std::pair{0.0, 1e214}, {1e-214, 0.0}}) {
+        EXPECT_EQ(PseudoInverse2026_head(a.handle(), tolerance, out.handle()), 0);
+        EXPECT_DOUBLE_EQ(out[3], expected);
+    }
 }
 TEST(PseudoInverse, CutsAtAnAbsoluteTolerance) {
     ErrorCode err;

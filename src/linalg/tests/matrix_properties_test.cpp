@@ -136,6 +136,41 @@ TEST(Rank, CountsSingularValuesAboveTheTolerance) {
     EXPECT_EQ(Rank(DBLMatrix(1, 1, {nan}), -1.0, ErrNonFiniteInput), -1);
 }
 
+TEST(Revisions, OfNormConditionAndRankHoldFromEndToEndOfTheRange) {
+    // Singular values 2, 1, and 1e-3 of the largest number.
+    for (const double size : {1e-300, 1e-160, 1e-17, 1.0, 1e155, 8e307}) {
+        SCOPED_TRACE(size);
+        const DBLMatrix a(3, 3, {0, 2 * size, 0, size, 0, 0, 0, 0, 1e-3 * size});
+        const CDBMatrix z(2, 3, {{0, 0}, {0, 2 * size}, {0, 0}, {-size, 0}, {0, 0}, {0, 0}});
+        double value;
+        int32_t rank;
+        const double norms[] = {2, 2, std::sqrt(5.0 + 1e-6), 2};
+        const double conditions[] = {2000, 2000, std::sqrt((5 + 1e-6) * (1.25 + 1e6)), 2000};
+        for (const int type : {0, 1, 2, 3}) {
+            EXPECT_EQ(Norm2026_head(a.handle(), type, &value), 0);
+            EXPECT_NEAR(value / size, norms[type], 2e-15);
+            EXPECT_EQ(CondNumber2026_head(a.handle(), type, &value), 0);
+            EXPECT_NEAR(value, conditions[type], 1e-11);
+            EXPECT_EQ(CxNorm2026_head(z.handle(), type, &value), 0);
+            EXPECT_NEAR(value / size, type == 2 ? std::sqrt(5.0) : 2.0, 2e-15);
+        }
+        EXPECT_EQ(CxCondNumber2026_head(z.handle(), 0, &value), 0);
+        EXPECT_NEAR(value, 2.0, 1e-15);
+        EXPECT_EQ(CxCondNumber2026_head(z.handle(), 1, &value), ErrNotSquare);
+        for (const auto &[tolerance, expected] :
+             {std::pair(-1.0, 3), {0.9, 2}, {1.9, 1}, {2.5, 0}}) {
+            EXPECT_EQ(Rank2026_head(a.handle(), tolerance * size, &rank), 0);
+            EXPECT_EQ(rank, expected);
+        }
+        EXPECT_EQ(CxRank2026_head(z.handle(), nan, &rank), 0);
+        EXPECT_EQ(rank, 2);
+    }
+    double value;
+    const DBLMatrix huge(1, 2, {1.7e308, 1.7e308});
+    EXPECT_EQ(Norm2026_head(huge.handle(), 3, &value), 0);
+    EXPECT_EQ(value, inf);
+}
+
 TEST(Vectors, ProductsAndNorms) {
     double value;
     CDB z;

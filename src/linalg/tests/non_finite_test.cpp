@@ -85,6 +85,35 @@ std::vector<Refuser<E>> Systems() {
                                                                         x.handle());
          },
          any},
+        {"GenLinEqs2026",
+         [](M a, M b) {
+             V x, right = Elements(b);
+             return Twin<E>(GenLinEqs2026_head, CxGenLinEqs2026_head)(a.handle(), right.handle(),
+                                                                      x.handle(), -1.0);
+         },
+         any | LargestIsFine},
+        {"EqsSetBySVD2026",
+         [](M a, M b) {
+             M x;
+             return Twin<E>(EqsSetBySVD2026_head, CxEqsSetBySVD2026_head)(a.handle(), b.handle(),
+                                                                          x.handle(), -1.0);
+         },
+         any | LargestIsFine},
+        {"EqsSetByLU2026",
+         [](M a, M b) {
+             M x;
+             DBL reciprocal;
+             return Twin<E>(EqsSetByLU2026_head, CxEqsSetByLU2026_head)(a.handle(), b.handle(),
+                                                                        x.handle(), &reciprocal);
+         },
+         RightSide | LargestIsFine},
+        {"PseudoInverse2026",
+         [](M a, M) {
+             M out;
+             return Twin<E>(PseudoInverse2026_head, CxPseudoInverse2026_head)(a.handle(), -1.0,
+                                                                              out.handle());
+         },
+         Rectangular | LargestIsFine},
         {"EqsByCholeskyDri",
          [](M a, M b) {
              V x, right = Elements(b);
@@ -163,6 +192,20 @@ std::vector<Refuser<E>> Factorisations() {
                                                       v.handle());
          },
          Rectangular},
+        {"SVD2026",
+         [](M a, M) {
+             Reals s;
+             M u, v;
+             return Twin<E>(SVD2026_head, CxSVD2026_head)(a.handle(), 1, u.handle(), s.handle(),
+                                                          v.handle());
+         },
+         Rectangular | LargestIsFine},
+        {"SVDS2026",
+         [](M a, M) {
+             Reals s;
+             return Twin<E>(SVDS2026_head, CxSVDS2026_head)(a.handle(), s.handle());
+         },
+         Rectangular | LargestIsFine},
         {"SVDS",
          [](M a, M) {
              Reals s;
@@ -298,6 +341,12 @@ std::vector<Refuser<E>> Properties() {
              return ErrOf(Twin<E>(Rank_head, CxRank_head), a.handle(), &tolerance, &rank);
          },
          Rectangular},
+        {"Rank2026",
+         [](M a, M) {
+             int32_t rank;
+             return Twin<E>(Rank2026_head, CxRank2026_head)(a.handle(), -1.0, &rank);
+         },
+         Rectangular | LargestIsFine},
         {"CheckPosdef",
          [](M a, M) {
              int32_t isDefinite;
@@ -325,6 +374,19 @@ std::vector<Refuser<E>> Properties() {
                            return ErrOf(Twin<E>(Determinant_head, CxDeterminant_head), a.handle(),
                                         &type, &det);
                        }});
+        all.push_back({"Norm2026 " + name,
+                       [=](M a, M) {
+                           DBL norm;
+                           return Twin<E>(Norm2026_head, CxNorm2026_head)(a.handle(), type, &norm);
+                       },
+                       Rectangular | LargestIsFine});
+        all.push_back({"CondNumber2026 " + name,
+                       [=](M a, M) {
+                           DBL cond;
+                           return Twin<E>(CondNumber2026_head, CxCondNumber2026_head)(a.handle(),
+                                                                                      type, &cond);
+                       },
+                       reads | LargestIsFine});
         all.push_back({"Norm " + name,
                        [=](M a, M) {
                            DBL norm;

@@ -1,0 +1,184 @@
+#!/usr/bin/python3
+"""Writes docs/accuracy/matrix_revisions.md: elders, revisions and LAPACK (through SciPy) on the same matrices
+of every size of elements.
+
+usage: QX_LIBRARY_DIR=build/release PYTHONPATH=python tools/accuracy/matrix_revisions.py
+"""
+
+import warnings
+from pathlib import Path
+
+import numpy as np
+from scipy import linalg
+
+import qx
+
+PAGE = Path(__file__).resolve().parents[2] / "docs/accuracy/matrix_revisions.md"
+EPS = 2.0**-52
+SHAPES = ((1, 1), (5, 9), (30, 7), (100, 100), (40, 200), (200, 200))
+ORDERS = (1, 2, 5, 30, 100, 200)
+POWERS = (-300, -150, -30, -16, -12, -8, 0, 150, 300)
+random = np.random.default_rng(1)
+
+
+def noise(m, n, kind):
+    real = random.standard_normal((m, n))
+    return real + 1j * random.standard_normal((m, n)) if kind == "complex" else real
+
+
+KINDS = {
+    "random": noise,
+    "graded": lambda m, n, kind: noise(m, n, kind) * np.exp2(-np.add.outer(np.arange(m), np.arange(n)) / 4),
+    "of rank n/2": lambda m, n, kind: noise(m, (min(m, n) + 1) // 2, kind) @ noise((min(m, n) + 1) // 2, n, kind),
+    "zero": lambda m, n, kind: 0 * noise(m, n, kind),
+}
+
+
+def norm(a):
+    return np.sqrt((np.abs(a) ** 2).sum())
+
+
+def call(name, *arguments):
+    prefix = "Cx" if any(np.iscomplexobj(a) for a in arguments) else ""
+    with warnings.catch_warnings():
+        warnings.simplefilter("ignore")
+        return qx.call(prefix + name, *arguments)
+
+
+def long(a):
+    return np.asarray(a, dtype=np.clongdouble if np.iscomplexobj(a) else np.longdouble)
+
+
+def decomposition_ratios(a, u, s, v):
+    """Residual, and how far u and v are from orthonormal, in units of max(m, n) eps."""
+    unit = EPS * max(a.shape)
+    residual = norm(long(u) * long(s) @ long(v).conj().T - long(a))
+    apart = [norm(long(q).conj().T @ long(q) - np.eye(q.shape[1])) / unit for q in (u, v)]
+    return float(residual / (norm(long(a)) or 1) / unit), float(max(apart))
+
+
+def decompositions(a):
+    yield "elder", call("SVDEx_head", a, 0)
+    yield "revision", call("SVD2026_head", a, 0)
+    u, s, vh = linalg.svd(a, full_matrices=False, lapack_driver="gesvd")
+    yield "LAPACK", (u, s, vh.conj().T)
+
+
+def values_ratio(a):
+    """The singular values against LAPACK's of the matrix next to 1, in units of max(m, n) eps."""
+    largest = np.abs(a).max() or 1.0
+    power = 2.0 ** np.floor(np.log2(largest))
+    expected = linalg.svdvals(a / power)
+    found = {"elder": call("SVDS_head", a), "revision": call("SVDS2026_head", a)}
+    return {name: float(np.abs(s / power - expected).max() / (expected[0] or 1) / EPS / max(a.shape))
+            for name, s in found.items()}
+
+
+def worst(rows):
+    return [max(column) for column in zip(*rows)]
+
+
+def decomposition_table():
+    lines = ["| Elements | matrix | elder: residual, orthogonality, values | revision | LAPACK: residual, orthogonality |",
+             "|---|---|---|---|---|"]
+    for power in POWERS:
+        for name, matrix in KINDS.items():
+            if name == "zero" and power:
+                continue
+            found = {"elder": [], "revision": [], "LAPACK": []}
+            for shape in SHAPES:
+                for kind in ("real", "complex"):
+                    a = matrix(*shape, kind) * 10.0**power
+                    values = values_ratio(a)
+                    for who, (u, s, v) in decompositions(a):
+                        more = (values[who],) if who in values else ()
+                        found[who].append(decomposition_ratios(a, u, s, v) + more)
+            cells = [", ".join(f"{x:.2g}" for x in worst(rows)) for rows in found.values()]
+            lines.append(f"| 1e{power} | {name} | " + " | ".join(cells) + " |")
+            print(lines[-1], flush=True)
+    return lines
+
+
+def conditioned(n, kind, condition):
+    q = [np.linalg.qr(noise(n, n, kind))[0] for _ in range(2)]
+    return q[0] @ np.diag(np.geomspace(1, 1 / condition, n)) @ q[1]
+
+
+def solution_table():
+    """Relative errors of solutions, pseudo-inverses, norms and conditions, divided by eps times the condition
+    number, against the same in long double next to 1."""
+    lines = ["| Elements | least squares, elder | revision | dgelsd | pseudo-inverse, elder | revision | pinv | LU, revision | "
+             "dgesv | condition estimate / exact |", "|---" * 10 + "|"]
+    for power in POWERS:
+        rows = []
+        for n in ORDERS:
+            for kind in ("real", "complex"):
+                condition = 1000.0 if n > 1 else 1.0
+                one = conditioned(n, kind, condition)
+                a = one * 10.0**power
+                scale = 2.0 ** np.floor(np.log2(np.abs(a).max()))
+                near, x = a / scale, noise(n, 1, kind)
+                b = near @ x
+                exact = refined(near, b)
+                unit = EPS * condition * n
+
+                def error(found):
+                    return float(norm(long(found) - exact) / norm(exact) / unit)
+
+                inverse = refined(near, np.eye(n, dtype=near.dtype))
+
+                def inverse_error(found):
+                    return float(norm(long(found) - inverse) / norm(inverse) / unit)
+
+                lu, reciprocal = call("EqsSetByLU2026_head", a, b)
+                norms = np.abs(near).sum(0).max() * float(np.abs(inverse).sum(0).max())
+                with np.errstate(all="ignore"):
+                    rows.append((error(call("EqsSetBySVDDri_head", a, b) * scale),
+                                 error(call("EqsSetBySVD2026_head", a, b, -1.0) * scale),
+                                 error(linalg.lstsq(a, b, lapack_driver="gelsd")[0] * scale),
+                                 inverse_error(call("PseudoInverse_head", a, -1.0) * scale),
+                                 inverse_error(call("PseudoInverse2026_head", a, -1.0) * scale),
+                                 inverse_error(linalg.pinv(a) * scale), error(lu * scale),
+                                 error(linalg.solve(a, b) * scale), 1 / reciprocal / norms))
+        found = [*worst(rows)[:-1], min(row[-1] for row in rows)]
+        lines.append(f"| 1e{power} | " + " | ".join(f"{x:.2g}" for x in found) + " |")
+        print(lines[-1], flush=True)
+    return lines
+
+
+def refined(a, b):
+    """a^-1 b in long double, by refinement of the solution in double precision."""
+    factors = linalg.lu_factor(a)
+    x = long(np.zeros_like(b))
+    for _ in range(8):
+        left = long(b) - long(a) @ x
+        x = x + long(linalg.lu_solve(factors, left.astype(a.dtype)))
+    return x
+
+
+def main():
+    tables = [decomposition_table(), solution_table()]
+    PAGE.write_text(f"""# Accuracy of the revisions of linear algebra
+
+Elders, revisions and LAPACK (through SciPy) on the same real and complex matrices, with elements of the size in the
+first column. Written by `tools/accuracy/matrix_revisions.py`.
+
+## Singular values
+
+Worst over the shapes {", ".join(f"{m} by {n}" for m, n in SHAPES)}, in units of max(m, n) eps: |a - u diag(s) v^H| /
+|a| and how far u and v are from orthonormal, formed in long double, with Frobenius norms; then the values against
+LAPACK's of the matrix next to 1, relative to the largest one.
+
+""" + "\n".join(tables[0]) + f"""
+
+## Systems, least squares and pseudo-inverses
+
+Relative errors in units of n eps times the condition number, which is 1000, worst over the orders {", ".join(map(str, ORDERS))},
+against solutions that are refined in long double. The last column is the smallest quotient of the condition number
+that `EqsSetByLU2026_head` estimates and the exact one in the 1-norm.
+
+""" + "\n".join(tables[1]) + "\n")
+
+
+if __name__ == "__main__":
+    main()
