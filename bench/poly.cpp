@@ -6,6 +6,7 @@
 #include "bench/timing.h"
 #include "poly/complex_roots.h"
 #include "poly/multiple_roots.h"
+#include "poly/simultaneous_roots.h"
 
 #include <cstdint>
 #include <random>
@@ -81,7 +82,8 @@ double PeerSeconds([[maybe_unused]] const std::vector<double> &a) {
 } // namespace
 
 int main() {
-    Ratios search("all roots by Newton's method"), multiple("roots with multiplicities");
+    Ratios search("all roots by Newton's method"), multiple("roots with multiplicities"),
+        together("all roots at once, revision");
     for (const Kind &kind : kinds) {
         for (const int32_t degree : {3, 6, 12, 24, 48, 96}) {
             if (degree > 24 && std::string(kind.name) != "random")
@@ -92,6 +94,7 @@ int main() {
             for (const double value : a)
                 coefficients.push_back({value, 0.0});
             std::vector<int32_t> times(a.size());
+            std::vector<double> radii(a.size());
             int32_t count = 0;
             const auto seconds = LeastTimes(
                 [&] {
@@ -103,21 +106,31 @@ int main() {
                         {roots.data(), n}, {simple.data(), n}, {times.data(), n}};
                     qx::FindMultipleRoots({coefficients.data(), n}, true, 0.0, &found);
                     Keep(roots[0]);
+                },
+                [&] {
+                    qx::SimultaneousRoots({coefficients.data(), n}, true, {roots.data(), degree},
+                                          {radii.data(), degree});
+                    Keep(roots[0]);
                 });
             const double peer = PeerSeconds(a);
-            std::printf("%-10s degree %3d  search %10.2f us %s  multiple %10.2f us %s\n", kind.name,
-                        degree, seconds[0] * 1e6,
-                        qx::bench::Cell(peer > 0 ? seconds[0] / peer : 0).c_str(), seconds[1] * 1e6,
-                        qx::bench::Cell(peer > 0 ? seconds[1] / peer : 0).c_str());
+            const auto ratio = [&](int which) {
+                return qx::bench::Cell(peer > 0 ? seconds[which] / peer : 0);
+            };
+            std::printf("%-10s degree %3d  search %10.2f us %s  multiple %10.2f us %s  at once "
+                        "%10.2f us %s\n",
+                        kind.name, degree, seconds[0] * 1e6, ratio(0).c_str(), seconds[1] * 1e6,
+                        ratio(1).c_str(), seconds[2] * 1e6, ratio(2).c_str());
             if (peer > 0) {
                 const std::string name =
                     std::string(kind.name) + ", degree " + std::to_string(degree);
                 search.add(seconds[0] / peer, name);
                 multiple.add(seconds[1] / peer, name);
+                together.add(seconds[2] / peer, name);
             }
         }
     }
     search.summary("GSL, eigenvalues");
     multiple.summary("GSL, eigenvalues, without multiplicities");
+    together.summary("GSL, eigenvalues");
     return 0;
 }

@@ -36,8 +36,8 @@ QX_API ErrorCode PolyRootsNtBst_head(QX_IN DBL1D coef, QX_IN DBL1D realGuesses,
     errors by powers of it, and the others may lose all digits, with the code 0. Of 10000
     polynomials of degree 25 with normal random coefficients, the product of the roots was off by
     more than 1e-12 of the coefficients for 55, 1e-8 for 9, and 0.1 for 2; of 5000 of degree 50 for
-    63, 17 and 7; up to degree 10 it was within 1e-11. CxMultPolyRoots_head with refinement has no
-    deflation. Where squares of coefficients or quotients of them overflow, roots may be infinite or
+    63, 17 and 7; up to degree 10 it was within 1e-11. CxPolyRoots2026_head has no deflation and no
+    such losses. Where squares of coefficients or quotients of them overflow, roots may be infinite or
     NaN. The code is in *err.
     Codes: ErrEmptyInput (coef is empty), ErrBadCoefficients (a coefficient is NaN, or the
     polynomial is constant), ErrOutOfMemory (no memory, or the host refuses the resize),
@@ -45,6 +45,24 @@ QX_API ErrorCode PolyRootsNtBst_head(QX_IN DBL1D coef, QX_IN DBL1D realGuesses,
     NaN: coef refused with ErrBadCoefficients. */
 QX_API int32_t CxPolyRoots_head(QX_INOUT CDB1D coef, QX_IN const int32_t *maxIterations,
                                 QX_OUT ErrorCode *err);
+
+/** All roots of a real polynomial at once, each as often as its multiplicity, by rising modulus; real
+    or exact conjugate pairs, of which the upper root comes first. Coefficients of 0 at the top do
+    not count. The iteration of L. W. Ehrlich and O. Aberth from the start of D. A. Bini, "Numerical
+    computation of polynomial zeros by means of Aberth's method", 1996; at the end with values of
+    twice the precision (S. Graillat, P. Langlois and N. Louvet, "Compensated Horner scheme", 2005),
+    so that simple roots are those of the given coefficients to about 2 eps as long as their
+    condition number is below 1e15. Coefficients may be of any size. For each root z |p(z)| is at
+    most 4 n eps (|a[0]| + |a[1] z| + ... + |a[n] z^n|), to degree 200 and more, and radii[i] is the
+    radius of a disc around roots[i] in which the polynomial has a root; for clusters and multiple
+    roots it is wide. The time grows with the square of the degree: 0.4 ms at degree 50, 6 ms at
+    degree 200.
+    Codes: ErrEmptyInput (coef is empty), ErrBadCoefficients (a coefficient is not finite, or the
+    polynomial is constant), ErrOutOfMemory (no memory, or the host refuses an output), ErrOverflow
+    (a root is beyond the range of double), ErrIterationLimit (600 sweeps were not enough). */
+QX_API ErrorCode PolyRoots2026_head(QX_IN DBL1D coef, QX_OUT CDB1D roots, QX_OUT DBL1D radii);
+/** As PolyRoots2026_head, for complex coefficients, without pairs. */
+QX_API ErrorCode CxPolyRoots2026_head(QX_IN CDB1D coef, QX_OUT CDB1D roots, QX_OUT DBL1D radii);
 
 /** Distinct roots of a real polynomial and their multiplicities: the structure by repeated greatest
     common divisors of the polynomial and its derivative, and with refine other than 0 the roots for

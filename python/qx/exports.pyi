@@ -1681,6 +1681,14 @@ def CxPolyRoots_head(coef: ArrayLike, maxIterations: int) -> NDArray[np.complex1
     """All roots of a complex polynomial in place of its coefficients, in the order in which they are ..."""
 
 
+def PolyRoots2026_head(coef: ArrayLike) -> tuple[NDArray[np.complex128], NDArray[np.float64]]:
+    """All roots of a real polynomial at once, each as often as its multiplicity, by rising modulus; ..."""
+
+
+def CxPolyRoots2026_head(coef: ArrayLike) -> tuple[NDArray[np.complex128], NDArray[np.float64]]:
+    """As PolyRoots2026_head, for complex coefficients, without pairs. All roots of a real polynomial ..."""
+
+
 def MultPolyRoots_head(coef: ArrayLike, refine: int, tolerance: float) -> tuple[NDArray[np.float64], NDArray[np.complex128], NDArray[np.complex128], NDArray[np.int32]]:
     """Distinct roots of a real polynomial and their multiplicities: the structure by repeated greatest ..."""
 

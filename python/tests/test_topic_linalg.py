@@ -190,7 +190,9 @@ class Decompositions(unittest.TestCase):
         close(linalg.logm(a), scipy.linalg.logm(a), 1e-6, 1e-7)
         close(linalg.sqrtm(a), scipy.linalg.sqrtm(a), 1e-8)
         close(linalg.matrix_power(a, -2), np.linalg.matrix_power(a, -2), 1e-8)
-        self.assertEqual(linalg.sqrtm(a).dtype, float)
+        for _ in range(20):
+            self.assertEqual(linalg.sqrtm(0.3 * some(4, 4) + 2 * np.eye(4)).dtype, float)
+        self.assertEqual(linalg.sqrtm(np.diag([1.0, -4.0])).dtype, complex)
         b, q = some(3, 3, is_complex=True) + 4 * np.eye(3), some(4, 3)
         close(linalg.solve_sylvester(a, b, q), scipy.linalg.solve_sylvester(a.astype(complex), b, q), 1e-8)
         q = some(4, 4)

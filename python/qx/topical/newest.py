@@ -128,6 +128,7 @@ NEWEST = {
         "compose": "PolyComposeH", "compose_complex": "CxPolyComposeH",
         "derivative": "PolyDerivativeH", "derivative_complex": "CxPolyDerivativeH",
         "integral": "PolyIntegralH", "integral_complex": "CxPolyIntegralH",
+        "roots": "PolyRoots2026_head", "roots_complex": "CxPolyRoots2026_head",
         "multiple_roots": "MultPolyRoots_head", "multiple_roots_complex": "CxMultPolyRoots_head",
         "lcm": "PolyLCM_H", "evaluate": "PolyEv", "evaluate_complex": "CxPolyEv",
         "evaluate_matrix": "EvPoly2D", "evaluate_matrix_complex": "CxEvPoly2D",

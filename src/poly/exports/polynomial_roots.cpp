@@ -5,6 +5,7 @@
 #include "poly/complex_roots.h"
 #include "poly/multiple_roots.h"
 #include "poly/newton_bairstow.h"
+#include "poly/simultaneous_roots.h"
 
 namespace qx {
 namespace {
@@ -84,6 +85,27 @@ Outcome RootsWithMultiplicities(InOut<Handle> coef, int32_t refine, double toler
     return CopyOut(roots.multiplicity, roots.count, multiplicities);
 }
 
+template <class Handle>
+Outcome AllRoots(In<Handle> coef, Out<CDB1D> roots, Out<DBL1D> radii) {
+    if (coef.isEmpty())
+        return ErrEmptyInput;
+    ComplexVector widened;
+    ScratchParts memory;
+    if (const ErrorCode failed = memory.take(Sized(widened, coef.size())))
+        return failed;
+    for (std::ptrdiff_t k = 0; k < coef.size(); ++k)
+        widened[k] = Widened(coef.data()[k]);
+    const int32_t degree = DegreeOf(widened);
+    if (degree < 1)
+        return ErrBadCoefficients;
+    if (const Outcome bad = roots.resize(degree))
+        return bad;
+    if (const Outcome bad = radii.resize(degree))
+        return bad;
+    constexpr bool isReal = HandleTraits<Handle>::code == ElementType::DBL;
+    return SimultaneousRoots(widened, isReal, roots.view(), radii.view());
+}
+
 } // namespace
 } // namespace qx
 
@@ -101,6 +123,13 @@ ErrorCode PolyRootsNtBst_head(DBL1D coef, DBL1D realGuesses, int32_t newtonMaxIt
 
 int32_t CxPolyRoots_head(CDB1D coef, const int32_t *maxIterations, ErrorCode *err) {
     return InErr(err, qx::FindRoots, coef, *maxIterations);
+}
+
+ErrorCode PolyRoots2026_head(DBL1D coef, CDB1D roots, DBL1D radii) {
+    return Returned(qx::AllRoots<DBL1D>, coef, roots, radii);
+}
+ErrorCode CxPolyRoots2026_head(CDB1D coef, CDB1D roots, DBL1D radii) {
+    return Returned(qx::AllRoots<CDB1D>, coef, roots, radii);
 }
 
 ErrorCode MultPolyRoots_head(DBL1D coef, int32_t refine, double tolerance, CDB1D refined,

@@ -63,6 +63,27 @@ std::vector<Recipe> PolynomialRootsRecipes() {
          },
          None, degrees},
     };
+    recipes.push_back({"PolyRoots2026_head",
+                       [](Call &c) {
+                           return PolyRoots2026_head(c.in<DBL>(0, c.n + 1), c.out<CDB>(0),
+                                                     c.out<DBL>(1));
+                       },
+                       None, degrees});
+    recipes.push_back({"CxPolyRoots2026_head",
+                       [](Call &c) {
+                           return CxPolyRoots2026_head(c.in<CDB>(0, c.n + 1), c.out<CDB>(0),
+                                                       c.out<DBL>(1));
+                       },
+                       None, degrees});
+    recipes.push_back(
+        {"PolyRoots2026_head: multiple roots",
+         [](Call &c) {
+             const int32_t n = c.n;
+             return PolyRoots2026_head(
+                 c.in<DBL>(0, n + 1, [n](int32_t k) { return WithMultipleRoots(k, n); }),
+                 c.out<CDB>(0), c.out<DBL>(1));
+         },
+         None, degrees});
     AddMultiple<DBL>(recipes, "MultPolyRoots_head", MultPolyRoots_head);
     AddMultiple<CDB>(recipes, "CxMultPolyRoots_head", CxMultPolyRoots_head);
     return recipes;

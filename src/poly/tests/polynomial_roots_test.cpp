@@ -2,6 +2,7 @@
 
 #include "qx/errors.h"
 #include "tests/support/hostile_host.h"
+#include "tests/support/recipe.h"
 #include "tests/support/test_data.h"
 
 #include <gtest/gtest.h>
@@ -184,6 +185,159 @@ TEST(CxPolyRoots, Failures) {
     flat[0] = -1;
     flat[43] = 1;
     EXPECT_EQ(code(flat, INT32_MAX), ErrIterationLimit);
+}
+
+ErrorCode AllRoots(const Complexes &coefficients, Complexes &roots, std::vector<double> &radii) {
+    const CDBArray coef = ToHost(coefficients), found(1);
+    const DBLArray around(1);
+    const ErrorCode status = CxPolyRoots2026_head(coef.handle(), found.handle(), around.handle());
+    roots = Values(found);
+    radii = around.values();
+    return status;
+}
+// Of the real parts alone.
+ErrorCode AllRealRoots(const Complexes &coefficients, Complexes &roots,
+                       std::vector<double> &radii) {
+    std::vector<double> real;
+    for (const Complex &coefficient : coefficients)
+        real.push_back(coefficient.real());
+    const DBLArray coef(real), around(1);
+    const CDBArray found(1);
+    const ErrorCode status = PolyRoots2026_head(coef.handle(), found.handle(), around.handle());
+    roots = Values(found);
+    radii = around.values();
+    return status;
+}
+
+// The largest |p(z)| / sum of |a[i]| |z|^i over the roots, in units of n eps.
+double WorstResidual(const Complexes &a, const Complexes &roots) {
+    typedef std::complex<long double> Long;
+    long double worst = 0;
+    for (const Complex &root : roots) {
+        Long p = 0;
+        long double sum = 0;
+        for (std::size_t i = a.size(); i-- > 0;) {
+            p = p * Long(root) + Long(a[i]);
+            sum = sum * std::abs(Long(root)) + std::abs(Long(a[i]));
+        }
+        worst = std::max(worst, sum > 0 ? std::abs(p) / sum : 0);
+    }
+    return static_cast<double>(worst / (static_cast<long double>(roots.size()) * epsilon));
+}
+
+bool AreRealOrPairs(const Complexes &roots) {
+    for (std::size_t i = 0; i < roots.size(); ++i)
+        if (roots[i].imag() != 0 &&
+            (++i == roots.size() || roots[i] != std::conj(roots[i - 1]) || roots[i].imag() > 0))
+            return false;
+    return true;
+}
+
+// Condition numbers go up to 5e13 here: twice the digits leave the rounding of the result.
+TEST(PolyRoots2026, FindsTheRootsOfTheCoefficientsAsTheyAre) {
+    for (const Case &example : ReadCases()) {
+        SCOPED_TRACE(example.name);
+        Complexes roots;
+        std::vector<double> radii;
+        ASSERT_EQ(AllRoots(example.coefficients, roots, radii), 0);
+        ASSERT_EQ(roots.size(), example.roots.size());
+        for (const auto &[root, condition] : example.roots) {
+            std::size_t at = 0;
+            for (std::size_t i = 1; i < roots.size(); ++i)
+                if (std::abs(roots[i] - root) < std::abs(roots[at] - root))
+                    at = i;
+            const double n = static_cast<double>(roots.size());
+            EXPECT_LE(std::abs(roots[at] - root),
+                      (4 * epsilon + 8 * n * n * condition * epsilon * epsilon) * std::abs(root));
+            EXPECT_LE(std::abs(roots[at] - root), radii[at] + epsilon * std::abs(root));
+            if (condition < 1e8) {
+                EXPECT_LE(radii[at], 1e-12 * std::abs(root));
+            }
+        }
+        EXPECT_LT(WorstResidual(example.coefficients, roots), 4.0);
+    }
+}
+
+TEST(PolyRoots2026, LeavesResidualsOfRoundingErrorsFromEndToEndOfTheRange) {
+    qx::test::Noise noise(26);
+    const auto phased = [&](double modulus) {
+        return std::polar(modulus, 3.2 * noise.symmetric());
+    };
+    for (int round = 0; round < 300; ++round) {
+        // Long ones with coefficients near 1; short ones with any, whose powers long double holds.
+        const int kind = round % 3, degree = 1 + (kind == 0 ? round % 200 : round % 23);
+        Complexes a;
+        for (int i = 0; i <= degree; ++i)
+            a.push_back(phased(kind == 0   ? noise.symmetric()
+                               : kind == 1 ? std::pow(10.0, 100 * noise.symmetric())
+                                           : std::round(3 * noise.symmetric())));
+        a.back() = kind == 2 ? 1.0 : a.back();
+        SCOPED_TRACE(testing::Message() << round << ", degree " << degree);
+        Complexes roots;
+        std::vector<double> radii;
+        ASSERT_EQ(AllRoots(a, roots, radii), 0);
+        EXPECT_EQ(roots.size(), a.size() - 1);
+        EXPECT_LT(WorstResidual(a, roots), 4.0);
+        for (Complex &coefficient : a)
+            coefficient = coefficient.real();
+        ASSERT_EQ(AllRealRoots(a, roots, radii), 0);
+        EXPECT_LT(WorstResidual(a, roots), 4.0);
+        EXPECT_TRUE(AreRealOrPairs(roots));
+    }
+}
+
+TEST(PolyRoots2026, OfMultipleRootsAreAsNearAsTheDigitsOfTheCoefficientsSay) {
+    const struct {
+        Complexes roots;
+        double error;
+    } cases[] = {{{1, 1, 1, 2, 3}, 1e-8},
+                 // A root of multiplicity 12, whose cluster is made conjugate.
+                 {{2, 2, 2, -2, -2, -2, -2, -2, -2, -2, -2, -2, -2, -2, -2, 0, 0, 0, 3, 3, 3}, 0.2},
+                 {{Complex(1, 1), Complex(1, -1), Complex(1, 1), Complex(1, -1)}, 1e-12}};
+    for (const auto &[expected, error] : cases) {
+        Complexes roots;
+        std::vector<double> radii;
+        const Complexes a = Product(expected);
+        ASSERT_EQ(AllRealRoots(a, roots, radii), 0);
+        EXPECT_LT(WorstResidual(a, roots), 4.0);
+        EXPECT_TRUE(AreRealOrPairs(roots));
+        for (std::size_t i = 0; i < roots.size(); ++i) {
+            double nearest = HUGE_VAL;
+            for (const Complex &root : expected)
+                nearest = std::min(nearest, std::abs(root - roots[i]));
+            EXPECT_LE(nearest, error);
+            EXPECT_LE(nearest, radii[i]);
+        }
+    }
+}
+
+TEST(PolyRoots2026, EndsOfTheCoefficientsAndFailures) {
+    Complexes roots;
+    std::vector<double> radii;
+    ASSERT_EQ(AllRealRoots({0, 0, -6, 5, -1, 0, 0}, roots, radii), 0);
+    EXPECT_EQ(roots, (Complexes{0, 0, 2, 3}));
+    EXPECT_EQ(radii[1], 0.0);
+    ASSERT_EQ(AllRealRoots({1e300, 0, 1e-300}, roots, radii), 0);
+    EXPECT_NEAR(roots[0].imag() * 1e-300, 1.0, 1e-15);
+    // Flat around 0, where the elder is stuck.
+    Complexes flat(44);
+    flat[0] = -1;
+    flat[43] = 1;
+    ASSERT_EQ(AllRoots(flat, roots, radii), 0);
+    for (const Complex &root : roots)
+        EXPECT_NEAR(std::abs(root), 1.0, 2 * epsilon);
+
+    for (const auto &[coefficients, code] : {std::pair<Complexes, ErrorCode>{{}, ErrEmptyInput},
+                                             {{5}, ErrBadCoefficients},
+                                             {{0, 0}, ErrBadCoefficients},
+                                             {{5, 0, 0}, ErrBadCoefficients},
+                                             {{1, nan}, ErrBadCoefficients},
+                                             {{1, 1, HUGE_VAL}, ErrBadCoefficients},
+                                             {{1e300, 1e-300}, ErrOverflow}}) {
+        EXPECT_EQ(AllRealRoots(coefficients, roots, radii), code);
+        EXPECT_EQ(AllRoots(coefficients, roots, radii), code);
+        EXPECT_TRUE(roots.empty() && radii.empty());
+    }
 }
 
 Complexes Polish(const std::vector<double> &coefficients, const std::vector<double> &realGuesses,

@@ -85,6 +85,40 @@ def eigenvalues(a):
     return attempt(lambda: np.roots(a[::-1]))
 
 
+def together(a):
+    """The roots of the revision and their radii."""
+    return attempt(lambda: qx.call("CxPolyRoots2026_head", a))
+
+
+def roots_together(a):
+    found = together(a)
+    return found and found[0]
+
+
+def long_residual(a, roots):
+    """The largest |p(z)| / sum of |a[i]| |z|^i in units of n eps, in long double."""
+    a, z = a.astype(np.clongdouble), roots.astype(np.clongdouble)
+    value, total = np.full(len(z), a[-1]), np.full(len(z), np.abs(a[-1]))
+    for coefficient in a[-2::-1]:
+        value, total = value * z + coefficient, total * np.abs(z) + np.abs(coefficient)
+    return float((np.abs(value) / total).max() / (len(roots) * EPSILON))
+
+
+def residual_table():
+    yield "| Degree | polynomials | CxPolyRoots: worst residual, above 4 | CxPolyRoots2026 | numpy.roots |"
+    yield "|---|---|---|---|---|"
+    for degree, count in ((10, 2000), (25, 2000), (50, 1000), (100, 200), (200, 50)):
+        random = np.random.default_rng(degree)
+        residuals = [[], [], []]
+        for _ in range(count):
+            a = (random.standard_normal(degree + 1) + 0j)
+            for found, method in zip(residuals, (one_by_one, roots_together, eigenvalues)):
+                z = method(a)
+                found.append(np.inf if z is None else long_residual(a, z))
+        yield f"| {degree} | {count} | " + " | ".join(
+            f"{max(found):.2g}, {sum(x > 4 for x in found)}" for found in residuals) + " |"
+
+
 def cell(errors, scale=None):
     if errors is None or not np.all(np.isfinite(errors)):
         return "-"
@@ -92,16 +126,16 @@ def cell(errors, scale=None):
 
 
 def simple_table():
-    yield ("| Polynomial | largest condition | CxPolyRoots | MultPolyRoots, refined | numpy.roots "
-           "| the same in units of condition n eps | | |")
-    yield "|---|---|---|---|---|---|---|---|"
+    yield ("| Polynomial | largest condition | CxPolyRoots | CxPolyRoots2026 | MultPolyRoots, refined | numpy.roots "
+           "| the same in units of condition n eps | | | |")
+    yield "|---|---|---|---|---|---|---|---|---|---|"
     for name, a, roots, conditions in cases():
         refined = structured(a)
         merged = refined is not None and len(refined[0]) < len(roots)
-        found = [one_by_one(a), refined and np.repeat(refined[0], refined[2]), eigenvalues(a)]
+        found = [one_by_one(a), roots_together(a), refined and np.repeat(refined[0], refined[2]), eigenvalues(a)]
         errors = [None if z is None else matched_errors(z, roots) for z in found]
         scale = conditions * EPSILON * len(roots)
-        marks = ["", f" ({len(refined[0])} distinct)" if merged else "", ""]
+        marks = ["", "", f" ({len(refined[0])} distinct)" if merged else "", ""]
         yield f"| {name} | {conditions.max():.2g} | " + " | ".join(
             [cell(e) + mark for e, mark in zip(errors, marks)]
             + [cell(e, scale) for e in errors]) + " |"
@@ -115,13 +149,13 @@ def scatter(found, structure):
 
 
 def structure_table():
-    yield ("| Polynomial | multiplicities found | refined | as found | CxPolyRoots | numpy.roots |")
-    yield "|---|---|---|---|---|---|"
+    yield ("| Polynomial | multiplicities found | refined | as found | CxPolyRoots | CxPolyRoots2026 | numpy.roots |")
+    yield "|---|---|---|---|---|---|---|"
     for name, structure in STRUCTURES.items():
         a = expanded(structure)
         refined, simple, times = structured(a)
         yield f"| {name} | {', '.join(map(str, times))} | " + " | ".join(
-            cell(scatter(z, structure)) for z in (refined, simple, one_by_one(a), eigenvalues(a))
+            cell(scatter(z, structure)) for z in (refined, simple, one_by_one(a), roots_together(a), eigenvalues(a))
         ) + " |"
 
 
@@ -167,7 +201,8 @@ companion matrix by LAPACK.
 
 Largest relative errors of a root against mpmath with 80 digits, for coefficients as they stand in
 double. The condition number of a root says by how much it moves for a relative change of all
-coefficients; no method can be held to less than that. The last three columns have the errors
+coefficients; no method in double can be held to less than that, and CxPolyRoots2026_head works with
+twice the digits at its end. The last four columns have the errors
 in the same order in units of each root's own condition number times the degree times 2.2e-16.
 
 {chr(10).join(simple_table())}
@@ -179,6 +214,11 @@ MultPolyRoots_head takes them for one.
 
 The search of CxPolyRoots_head can get stuck where the polynomial is flat to the last bit, as x^n - 1
 is around 0. It then ends in ErrIterationLimit: of n from 3 to 150 for {stuck}.
+
+Residuals |p(z)| / sum of |a[i]| |z|^i in units of n eps, for normal random coefficients: the worst,
+and of how many polynomials it is above 4 or no roots came out.
+
+{chr(10).join(residual_table())}
 
 Multiple roots: the largest relative distance of a root found from the nearest true one.
 
