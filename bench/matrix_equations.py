@@ -1,4 +1,4 @@
-"""Sylvester and Lyapunov equations against SciPy, in one process.
+"""Sylvester and Lyapunov equations and the matrix exponential against SciPy, in one process.
 
 Ours is the export through the binding. SciPy's speed depends on the BLAS that it finds; the first
 line names it.
@@ -76,6 +76,13 @@ def discrete_cases():
                    lambda: linalg.solve_discrete_lyapunov(a, q))
 
 
+def exponential_cases():
+    for kind, prefix in (("real", ""), ("complex", "Cx")):
+        for n in ORDERS:
+            a, = matrices(kind, n, 1)
+            yield (f"{kind}, n {n}", lambda: qx.call(prefix + "MatrixExp2026_head", a), lambda: linalg.expm(a))
+
+
 def blas_of_scipy():
     maps = Path("/proc/self/maps").read_text().split()
     return ", ".join(sorted({word for word in maps if re.match("lib.*blas", Path(word).name)}))
@@ -86,3 +93,4 @@ if __name__ == "__main__":
     compare("Sylvester equations", "SciPy", sylvester_cases())
     compare("continuous Lyapunov equations", "SciPy", continuous_cases())
     compare("discrete Lyapunov equations", "SciPy", discrete_cases())
+    compare("matrix exponentials, revision", "SciPy", exponential_cases())

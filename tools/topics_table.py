@@ -45,7 +45,7 @@ OTHERS = (
     ("*EqsBy* *EqsSetBy* *LULinEqs_head *LinEqs TriLinEqs_head *CholeskyLinEqs_head CxTriLinEqs_head", "linalg.solve"),
     ("*GenLinEqs*", "linalg.lstsq"), ("*InvMatrix* PreallocInv*", "linalg.inv"),
     ("Cholesky_head CxCholesky_head", "linalg.cholesky"), ("*qrd_head", "linalg.qr"), ("*SVD_head *SVDEx_head", "linalg.svd"),
-    ("*SVDS_head", "linalg.svdvals"), ("*PseudoInverse_head", "linalg.pinv"), ("Norm_head CxNorm_head", "linalg.norm"),
+    ("*SVDS_head", "linalg.svdvals"), ("*MatrixExp_head", "linalg.expm"), ("*PseudoInverse_head", "linalg.pinv"), ("Norm_head CxNorm_head", "linalg.norm"),
     ("*CondNumber_head", "linalg.cond"), ("Rank_head CxRank_head", "linalg.matrix_rank"),
     ("TriDiag*", "linalg.solve_banded"), ("*Schur_head", "linalg.schur"), ("*QZ_head", "linalg.qz"),
     ("MatrixSqrt_head", "linalg.sqrtm"), ("*Sylvester_head", "linalg.solve_sylvester"),

@@ -17,7 +17,8 @@ QX_BEGIN_DECLS
     to the largest element of the result the errors measured (random matrices of several kinds,
     orders 2 to 5) are rounding errors up to a norm of 0.1, up to 4e-8 next below 1, where rotations
     are worst, 6e-9 up to 2, 4e-10 up to 8, and above that those of the squaring, which grow with
-    the norm: 4e-14 at 100, 3e-13 at 500, and more where powers of a are far larger than exp(a).
+    the norm: 4e-14 at 100, 3e-13 at 500, and more where powers of a are far larger than exp(a);
+    those of MatrixExp2026_head are rounding errors.
     Elements that overflow, and what is computed from them, are infinite or NaN. C. Moler and C. Van
     Loan, "Nineteen dubious ways to compute the exponential of a matrix", 1978.
     Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory),
@@ -26,6 +27,18 @@ QX_BEGIN_DECLS
 QX_API int32_t MatrixExp_head(QX_INOUT DBL2D a, QX_OUT ErrorCode *err);
 /** As MatrixExp_head, for complex elements. */
 QX_API int32_t CxMatrixExp_head(QX_INOUT CDB2D a, QX_OUT ErrorCode *err);
+
+/** exp(a) of the square matrix a by scaling, a Pade approximant of degree 3 to 13 and repeated
+    squaring; of a diagonal matrix element by element. Degree and scaling follow from norms of powers
+    of a, so that one large element costs no digits where powers of a are small; the backward error
+    of the approximant is below 2.2e-16. Norms may be of any size. Elements that overflow, and what is
+    computed from them, are infinite or NaN. A. H. Al-Mohy and N. J. Higham, "A new scaling and
+    squaring algorithm for the matrix exponential", 2009.
+    Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrOutOfMemory (no memory, or
+    the host refuses the resize), ErrNonFiniteInput (an element is not finite). */
+QX_API ErrorCode MatrixExp2026_head(QX_IN DBL2D a, QX_OUT DBL2D out);
+/** As MatrixExp2026_head, for complex elements. */
+QX_API ErrorCode CxMatrixExp2026_head(QX_IN CDB2D a, QX_OUT CDB2D out);
 
 /** The principal logarithm of the square matrix a. It is that of the eigenvalues, if the condition
     number of the eigenvectors is up to 1e14, refined until its exponential gives a back to a

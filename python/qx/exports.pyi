@@ -1249,6 +1249,14 @@ def CxMatrixExp_head(a: ArrayLike) -> NDArray[np.complex128]:
     """As MatrixExp_head, for complex elements. exp(a) in place of the square matrix a, by scaling, a ..."""
 
 
+def MatrixExp2026_head(a: ArrayLike) -> NDArray[np.float64]:
+    """exp(a) of the square matrix a by scaling, a Pade approximant of degree 3 to 13 and repeated ..."""
+
+
+def CxMatrixExp2026_head(a: ArrayLike) -> NDArray[np.complex128]:
+    """As MatrixExp2026_head, for complex elements. exp(a) of the square matrix a by scaling, a Pade ..."""
+
+
 def MatrixLn_head(a: ArrayLike) -> NDArray[np.complex128]:
     """The principal logarithm of the square matrix a."""
 

@@ -105,7 +105,7 @@ NEWEST = {
         "cholesky": "FullCholesky_head", "cholesky_complex": "CxFullCholesky_head", "schur":
         "Schur80_head", "schur_complex": "CxSchur80_head", "qz": "QZ80_head", "qz_complex":
         "CxQZ80_head", "hessenberg": "Hessenberg_head", "hessenberg_complex": "CxHessenberg_head",
-        "expm": "MatrixExp_head", "expm_complex": "CxMatrixExp_head", "logm": "MatrixLn_head",
+        "expm": "MatrixExp2026_head", "expm_complex": "CxMatrixExp2026_head", "logm": "MatrixLn_head",
         "logm_complex": "CxMatrixLn_head", "sqrtm": "MatrixSqrtH", "sqrtm_complex":
         "CxMatrixSqrt_head", "matrix_power": "MatrixPower_head", "matrix_power_complex":
         "CxMatrixPower_head", "solve_sylvester": "Sylvester2011_head", "solve_sylvester_complex":

@@ -25,6 +25,14 @@ Outcome Exponential(InOut<Matrix> a) {
         return bad;
     return MatrixExponential<elementOf<Matrix>>(a.view());
 }
+template <class Matrix>
+Outcome Exponential2026(In<Matrix> a, Out<Matrix> out) {
+    if (const ErrorCode bad = SquareFirst(a))
+        return bad;
+    if (const Outcome bad = out.resize(a.rows(), a.rows()))
+        return bad;
+    return ScaledExponential<elementOf<Matrix>>(a.view(), out.view());
+}
 Outcome LogarithmInPlace(InOut<CDB2D> a) {
     if (const ErrorCode bad = SquareLast(a))
         return bad;
@@ -126,6 +134,12 @@ int32_t PseudoInverse_head(DBL2D a, const double *tolerance, ErrorCode *err) {
 }
 int32_t CxPseudoInverse_head(CDB2D a, const double *tolerance, ErrorCode *err) {
     return InErr(err, qx::PseudoInverse<CDB2D>, a, *tolerance);
+}
+ErrorCode MatrixExp2026_head(DBL2D a, DBL2D out) {
+    return Returned(qx::Exponential2026<DBL2D>, a, out);
+}
+ErrorCode CxMatrixExp2026_head(CDB2D a, CDB2D out) {
+    return Returned(qx::Exponential2026<CDB2D>, a, out);
 }
 ErrorCode PseudoInverse2026_head(DBL2D a, double tolerance, DBL2D out) {
     return Returned(qx::PseudoInverse2026<DBL2D>, a, tolerance, out);

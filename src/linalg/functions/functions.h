@@ -14,6 +14,12 @@ namespace qx {
 template <ElementType E>
 ErrorCode MatrixExponential(const MatrixView<E> &a);
 
+// out = exp(a) by the method of A. H. Al-Mohy and N. J. Higham, "A new scaling and squaring algorithm
+// for the matrix exponential", 2009, for norms of any size. out shares no element with a.
+// ErrNonFiniteInput.
+template <ElementType E>
+ErrorCode ScaledExponential(ConstMatrixView<E> a, MatrixView<E> out);
+
 // The smallest degree q, at least 1, with e(q) exp(e(q)) <= tolerance / (exp(norm) norm), where
 // e(q) = 2^(3 - 2q) q!^2 / ((2q)! (2q + 1)!) bounds the error of the approximant.
 int32_t PadeDegree(double tolerance, double norm);

@@ -34,6 +34,12 @@ Recipe PseudoInverse(const char *name, Export function) {
 }
 
 template <ElementType Code, class Export>
+Recipe Exponential2026(const char *name, Export function) {
+    return {name,
+            [function](Call &c) { return function(c.in2D<Code>(0, c.n, c.n), c.out2D<Code>(0)); },
+            None, sizes};
+}
+template <ElementType Code, class Export>
 Recipe PseudoInverse2026(const char *name, Export function) {
     return {name,
             [function](Call &c) {
@@ -60,6 +66,8 @@ std::vector<Recipe> FunctionRecipes() {
         InPlace<CDB>("CxMatrixSqrt_head", CxMatrixSqrt_head),
         PseudoInverse<DBL>("PseudoInverse_head", PseudoInverse_head),
         PseudoInverse<CDB>("CxPseudoInverse_head", CxPseudoInverse_head),
+        Exponential2026<DBL>("MatrixExp2026_head", MatrixExp2026_head),
+        Exponential2026<CDB>("CxMatrixExp2026_head", CxMatrixExp2026_head),
         PseudoInverse2026<DBL>("PseudoInverse2026_head", PseudoInverse2026_head),
         PseudoInverse2026<CDB>("CxPseudoInverse2026_head", CxPseudoInverse2026_head),
     };

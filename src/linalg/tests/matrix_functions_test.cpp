@@ -78,6 +78,12 @@ TEST(MatrixFunctions, AgreeWithSixtyDigits) {
         CxMatrixLn_head(log.handle(), &err);
         EXPECT_GE(err, 0);
         EXPECT_LT(RelativeDeviation(Contents(log), Exact(c.n, c.n, c.log.data())), 1e-8);
+        CDB2DArray revision;
+        EXPECT_EQ(CxMatrixExp2026_head(CDB2DArray(c.n, c.n, c.a).handle(), revision.handle()), 0);
+        // Rounding errors times the condition number, which grows with the norm.
+        const double condition = static_cast<double>(Exact(c.n, c.n, c.a.data()).norm()) + 10;
+        EXPECT_LT(RelativeDeviation(Contents(revision), Exact(c.n, c.n, c.exp.data())),
+                  1e-15 * condition);
         const bool isRefined = err == 0;
         CxMatrixExp_head(log.handle(), &err);
         EXPECT_LT(RelativeDeviation(Contents(log), Exact(c.n, c.n, c.a.data())),
@@ -90,6 +96,10 @@ TEST(MatrixFunctions, AgreeWithSixtyDigits) {
         DBL2DArray a(c.n, c.n, c.real()), realExp = a, realRoot = a;
         MatrixExp_head(realExp.handle(), &err);
         EXPECT_LT(RelativeDeviation(Contents(realExp), Exact(c.n, c.n, c.exp.data())), 2e-9);
+        DBL2DArray realRevision;
+        EXPECT_EQ(MatrixExp2026_head(a.handle(), realRevision.handle()), 0);
+        EXPECT_LT(RelativeDeviation(Contents(realRevision), Exact(c.n, c.n, c.exp.data())),
+                  1e-15 * condition);
         MatrixLn_head(a.handle(), log.handle(), &err);
         EXPECT_LT(RelativeDeviation(Contents(log), Exact(c.n, c.n, c.log.data())), 1e-8);
         EXPECT_EQ(MatrixSqrtH(a.handle(), root.handle()), 0);
@@ -114,6 +124,35 @@ TEST(MatrixExponential, TakesADiagonalElementByElement) {
     EXPECT_NEAR(z[0].im, std::sin(3.0), 1e-16);
 }
 // 2^1024, by which such matrices are divided, is no number.
+// exp of (x, y; 0, z) has y (exp(x) - exp(z)) / (x - z) beside its diagonal, whatever the size of y.
+TEST(MatrixExponential, OfTheRevisionLosesNothingToOneLargeElement) {
+    for (const double large : {1.0, 1e6, 1e100, 1e290}) {
+        SCOPED_TRACE(large);
+        DBL2DArray out;
+        EXPECT_EQ(MatrixExp2026_head(DBL2DArray(2, 2, {1, large, 0, -1}).handle(), out.handle()),
+                  0);
+        EXPECT_NEAR(out[0] / std::exp(1.0), 1.0, 1e-15);
+        EXPECT_NEAR(out[1] / large / std::sinh(1.0), 1.0, 2e-15);
+        EXPECT_EQ(out[2], 0.0);
+        EXPECT_NEAR(out[3] / std::exp(-1.0), 1.0, 1e-15);
+        EXPECT_EQ(MatrixExp2026_head(DBL2DArray(3, 3, {0, large, 0, 0, 0, 1, 0, 0, 0}).handle(),
+                                     out.handle()),
+                  0);
+        EXPECT_EQ(out.values(), (std::vector<double>{1, large, large / 2, 0, 1, 1, 0, 0, 1}));
+    }
+    // The rotation by 2^k times an angle, and elements below any rounding.
+    DBL2DArray out;
+    for (const double angle : {1e-300, 1e-3, 0.5, 2.0, 100.0, 1e6}) {
+        EXPECT_EQ(
+            MatrixExp2026_head(DBL2DArray(2, 2, {0, -angle, angle, 0}).handle(), out.handle()), 0);
+        EXPECT_NEAR(out[0], std::cos(angle), 4e-16 * (angle + 4));
+        EXPECT_NEAR(out[2], std::sin(angle), 4e-16 * (angle + 4) * std::min(angle, 1.0));
+    }
+    EXPECT_EQ(MatrixExp2026_head(DBL2DArray(2, 2, {-1e300, 1, 1, -1e300}).handle(), out.handle()),
+              0);
+    EXPECT_EQ(out.values(), std::vector<double>(4, 0.0));
+}
+
 TEST(MatrixExponential, OfTheLargestNormsIsInfiniteOrZero) {
     ErrorCode err;
     for (const double sign : {1.0, -1.0}) {

@@ -332,6 +332,12 @@ std::vector<Refuser<E>> Properties() {
         {"MatrixExp",
          [](M a, M) { return ErrOf(Twin<E>(MatrixExp_head, CxMatrixExp_head), a.handle()); },
          FullOnly},
+        {"MatrixExp2026",
+         [](M a, M) {
+             M out;
+             return Twin<E>(MatrixExp2026_head, CxMatrixExp2026_head)(a.handle(), out.handle());
+         },
+         LargestIsFine},
         {"MatrixPower -1",
          [](M a, M) { return Twin<E>(MatrixPower_head, CxMatrixPower_head)(a.handle(), -1); }},
         {"Rank",
