@@ -17,8 +17,8 @@ QX_BEGIN_DECLS
     to the largest element of the result the errors measured (random matrices of several kinds,
     orders 2 to 5) are rounding errors up to a norm of 0.1, up to 4e-8 next below 1, where rotations
     are worst, 6e-9 up to 2, 4e-10 up to 8, and above that those of the squaring, which grow with
-    the norm: 4e-14 at 100, 3e-13 at 500, and more where powers of a are far larger than exp(a);
-    those of MatrixExp2026_head are rounding errors.
+    the norm: 4e-14 at 100, 3e-13 at 500, and more where powers of a are far larger than exp(a):
+    0.15 for (1, 1e100; 0, -1). Those of MatrixExp2026_head are rounding errors.
     Elements that overflow, and what is computed from them, are infinite or NaN. C. Moler and C. Van
     Loan, "Nineteen dubious ways to compute the exponential of a matrix", 1978.
     Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory),

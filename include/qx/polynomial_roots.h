@@ -13,6 +13,7 @@ QX_BEGIN_DECLS
     the two roots of a real quadratic factor. `roots` holds one root per guess: the real ones in
     their order, then the real and then the conjugate pairs of the second kind. Complex guesses stay
     as they are if the polynomial has fewer than 4 coefficients, and so does one without a partner.
+    PolyRoots2026_head needs no guesses.
     Iterations end when a relative change is below the tolerance, or at their limit, with the best
     values so far. A null array of guesses is an empty one. Where coef is empty, `roots` is emptied.
     Codes: WarnEmptyResult (coef is empty), ErrOutOfMemory (no memory, or the host refuses

@@ -108,8 +108,8 @@ def conditioned(n, kind, condition):
 def solution_table():
     """Relative errors of solutions, pseudo-inverses, norms and conditions, divided by eps times the condition
     number, against the same in long double next to 1."""
-    lines = ["| Elements | least squares, elder | revision | dgelsd | pseudo-inverse, elder | revision | pinv | LU, revision | "
-             "dgesv | condition estimate / exact |", "|---" * 10 + "|"]
+    lines = ["| Elements | least squares, elder | revision | dgelsd | pseudo-inverse, elder | revision | pinv "
+             "| LU, revision | dgesv | condition estimate / exact |", "|---" * 10 + "|"]
     for power in POWERS:
         rows = []
         for n in ORDERS:
@@ -196,9 +196,9 @@ LAPACK's of the matrix next to 1, relative to the largest one.
 
 ## Systems, least squares and pseudo-inverses
 
-Relative errors in units of n eps times the condition number, which is 1000, worst over the orders {", ".join(map(str, ORDERS))},
-against solutions that are refined in long double. The last column is the smallest quotient of the condition number
-that `EqsSetByLU2026_head` estimates and the exact one in the 1-norm.
+Relative errors in units of n eps times the condition number, which is 1000, worst over the orders
+{", ".join(map(str, ORDERS))}, against solutions that are refined in long double. The last column is the
+smallest quotient of the condition number that `EqsSetByLU2026_head` estimates and the exact one in the 1-norm.
 
 """ + "\n".join(tables[1]) + """
 
