@@ -204,7 +204,7 @@ void Triangular(const char *side, const char *uplo, const char *trans, const cha
 
 } // namespace qx::blas
 
-using namespace qx::blas;
+using qx::blas::Complex, qx::blas::MatrixMatrix, qx::blas::Real, qx::blas::Triangular;
 
 void dgemm_(const char *transA, const char *transB, const int32_t *m, const int32_t *n,
             const int32_t *k, const DBL *alpha, const DBL *a, const int32_t *lda, const DBL *b,

@@ -141,7 +141,8 @@ void Rotate(std::ptrdiff_t n, ElementOf<E> *x, std::ptrdiff_t incx, ElementOf<E>
 
 } // namespace qx::blas
 
-using namespace qx::blas;
+using qx::blas::AddMultiple, qx::blas::AddOuter, qx::blas::Complex, qx::blas::MatrixVector,
+    qx::blas::Real, qx::blas::Rotate;
 
 void dgemv_(const char *trans, const int32_t *m, const int32_t *n, const DBL *alpha, const DBL *a,
             const int32_t *lda, const DBL *x, const int32_t *incx, const DBL *beta, DBL *y,
