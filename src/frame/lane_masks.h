@@ -42,15 +42,7 @@ QX_INLINE Lanes<N> Sqrt(Lanes<N> x) {
 // The products of the lower halves of each 64 bits as unsigned integers, in full.
 template <class L>
 QX_INLINE BitsOf<L> ProductOfLowerHalves(BitsOf<L> a, BitsOf<L> b) {
-    if constexpr (L::count == 2)
-        return (BitsOf<L>)_mm_mul_epu32((__m128i)a, (__m128i)b);
-#ifdef __AVX2__
-    else
-        return (BitsOf<L>)_mm256_mul_epu32((__m256i)a, (__m256i)b);
-#else
-    else
-        return (a & 0xffffffff) * (b & 0xffffffff);
-#endif
+    return LowerProducts<L::count>(a, b);
 }
 // Shifted towards the lower bits, with zeros behind.
 template <class L>

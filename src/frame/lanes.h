@@ -291,6 +291,26 @@ QX_INLINE unsigned SignBits(Lanes<4> x) {
 #endif
 }
 
+// The products of the lower halves of each 64 bits as unsigned integers. clang++ makes one
+// instruction of the plain text, g++ three multiplications.
+template <int N>
+QX_INLINE typename LaneInteger<N>::type LowerProducts(typename LaneInteger<N>::type a,
+                                                      typename LaneInteger<N>::type b) {
+#ifndef __clang__
+    typedef int FourHalves __attribute__((vector_size(16)));
+    if constexpr (N == 2)
+        return (typename LaneInteger<N>::type)__builtin_ia32_pmuludq128((FourHalves)a,
+                                                                        (FourHalves)b);
+#ifdef __AVX2__
+    typedef int EightHalves __attribute__((vector_size(32)));
+    if constexpr (N == 4)
+        return (typename LaneInteger<N>::type)__builtin_ia32_pmuludq256((EightHalves)a,
+                                                                        (EightHalves)b);
+#endif
+#endif
+    return (a & 0xffffffff) * (b & 0xffffffff);
+}
+
 // N floats: the few operations that sums of products need. N is 1, 4 or 8.
 template <int N>
 struct FloatLaneVector;
