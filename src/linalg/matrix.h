@@ -35,7 +35,7 @@ RealMatrix PartsOf(const MatrixView<E> &a) {
 
 // Whether no element is NaN or infinite; the largest finite number is as good as any other.
 template <ElementType E>
-bool HoldsOnlyNumbers(ConstMatrixView<E> a) {
+bool HoldsOnlyNumbers(const ConstMatrixView<E> &a) {
     for (int32_t i = 0; i < a.rows(); ++i)
         for (int32_t j = 0; j < a.cols(); ++j)
             if (!std::isfinite(RealPart(a(i, j))) || !std::isfinite(ImagPart(a(i, j))))

@@ -36,7 +36,7 @@ int BringIntoRange(const MatrixView<E> &a, double tooSmall) {
 // returns the exponent that takes its values back; 0 for a matrix of zeros. No digit of an element
 // changes, unless it is so much smaller than the largest one that it vanishes.
 template <ElementType E>
-int ScaleTo(MatrixView<E> a, int target) {
+int ScaleTo(const MatrixView<E> &a, int target) {
     double largest = 0.0; // of parts: a sum of two could overflow
     for (int32_t i = 0; i < a.rows(); ++i)
         for (int32_t j = 0; j < a.cols(); ++j)
@@ -60,7 +60,7 @@ int ScaleTo(MatrixView<E> a, int target) {
 // times 2^exponent.
 template <ElementType E>
 struct ScaledCopy {
-    ErrorCode make(ConstMatrixView<E> a, int target = 0) {
+    ErrorCode make(const ConstMatrixView<E> &a, int target = 0) {
         if (const ErrorCode failed = memory.take(Sized(matrix, a.rows(), a.cols())))
             return failed;
         CopyMatrix<E>(a, matrix);
@@ -81,7 +81,7 @@ inline CDB TimesPower(CDB a, int exponent) {
 // A copy whose columns are scaled one by one, for right sides of very different size.
 template <ElementType E>
 struct ScaledColumns {
-    ErrorCode make(ConstMatrixView<E> b) {
+    ErrorCode make(const ConstMatrixView<E> &b) {
         if (const ErrorCode failed =
                 memory.take(Sized(matrix, b.rows(), b.cols()), Sized(exponents, b.cols())))
             return failed;
@@ -91,7 +91,7 @@ struct ScaledColumns {
         return 0;
     }
     // The solutions for the copy and for a matrix that was divided by 2^exponent.
-    void scaleBack(MatrixView<E> x, int exponent) const {
+    void scaleBack(const MatrixView<E> &x, int exponent) const {
         for (int32_t i = 0; i < x.rows(); ++i)
             for (int32_t j = 0; j < x.cols(); ++j)
                 x(i, j) = TimesPower(x(i, j), exponents[j] - exponent);

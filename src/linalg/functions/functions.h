@@ -18,7 +18,7 @@ ErrorCode MatrixExponential(const MatrixView<E> &a);
 // for the matrix exponential", 2009, for norms of any size. out shares no element with a.
 // ErrNonFiniteInput.
 template <ElementType E>
-ErrorCode ScaledExponential(ConstMatrixView<E> a, MatrixView<E> out);
+ErrorCode ScaledExponential(const ConstMatrixView<E> &a, const MatrixView<E> &out);
 
 // The smallest degree q, at least 1, with e(q) exp(e(q)) <= tolerance / (exp(norm) norm), where
 // e(q) = 2^(3 - 2q) q!^2 / ((2q)! (2q + 1)!) bounds the error of the approximant.

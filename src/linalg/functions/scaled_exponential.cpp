@@ -52,7 +52,7 @@ public:
     // The result's memory serves as work memory before.
     explicit Exponential2009(Matrix out) : out_(out) {}
 
-    ErrorCode find(ConstMatrixView<E> a) {
+    ErrorCode find(const ConstMatrixView<E> &a) {
         n_ = a.rows();
         if (const ErrorCode failed = memory_.take(
                 Sized(a_, n_, n_), Sized(a2_, n_, n_), Sized(a4_, n_, n_), Sized(a6_, n_, n_),
@@ -152,7 +152,7 @@ private:
         return std::max(0, int32_t(std::ceil((log + 53.0) / (2.0 * m))));
     }
 
-    static double oneNorm(ConstMatrixView<E> a) {
+    static double oneNorm(const ConstMatrixView<E> &a) {
         double largest = 0.0;
         for (int32_t j = 0; j < a.cols(); ++j) {
             double sum = 0.0;
@@ -265,7 +265,7 @@ private:
 } // namespace
 
 template <ElementType E>
-ErrorCode ScaledExponential(ConstMatrixView<E> a, MatrixView<E> out) {
+ErrorCode ScaledExponential(const ConstMatrixView<E> &a, const MatrixView<E> &out) {
     QX_EXPECTS(a.isSquare() && !a.isEmpty() && out.rows() == a.rows() && out.cols() == a.rows());
     if (!HoldsOnlyNumbers<E>(a))
         return ErrNonFiniteInput;
@@ -277,7 +277,7 @@ ErrorCode ScaledExponential(ConstMatrixView<E> a, MatrixView<E> out) {
     return 0;
 }
 
-template ErrorCode ScaledExponential(ConstRealMatrix, RealMatrix);
-template ErrorCode ScaledExponential(ConstComplexMatrix, ComplexMatrix);
+template ErrorCode ScaledExponential(const ConstRealMatrix &, const RealMatrix &);
+template ErrorCode ScaledExponential(const ConstComplexMatrix &, const ComplexMatrix &);
 
 } // namespace qx

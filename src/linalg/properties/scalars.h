@@ -35,11 +35,11 @@ ErrorCode MatrixRank(const ConstMatrixView<E> &a, double tolerance, int32_t *ran
 // The same three for matrices of any norm, which are scaled by a power of two: nothing overflows or
 // vanishes on the way. A tolerance that is not a number counts as negative.
 template <ElementType E>
-ErrorCode ScaledNorm(ConstMatrixView<E> a, int32_t normType, double *norm);
+ErrorCode ScaledNorm(const ConstMatrixView<E> &a, int32_t normType, double *norm);
 template <ElementType E>
-ErrorCode ScaledConditionNumber(ConstMatrixView<E> a, int32_t normType, double *cond);
+ErrorCode ScaledConditionNumber(const ConstMatrixView<E> &a, int32_t normType, double *cond);
 template <ElementType E>
-ErrorCode ScaledRank(ConstMatrixView<E> a, double tolerance, int32_t *rank);
+ErrorCode ScaledRank(const ConstMatrixView<E> &a, double tolerance, int32_t *rank);
 
 } // namespace qx
 

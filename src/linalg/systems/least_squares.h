@@ -40,10 +40,11 @@ ErrorCode PseudoInverseMatrix(const ConstMatrixView<E> &a, double tolerance,
 // is infinite. A tolerance below 0 or NaN is the machine epsilon for SolveScaledBySVD, and one of 0
 // stays. `out` may not take the place of a.
 template <ElementType E>
-ErrorCode SolveScaledBySVD(ConstMatrixView<E> a, ConstMatrixView<E> b, MatrixView<E> x,
-                           double tolerance);
+ErrorCode SolveScaledBySVD(const ConstMatrixView<E> &a, const ConstMatrixView<E> &b,
+                           const MatrixView<E> &x, double tolerance);
 template <ElementType E>
-ErrorCode ScaledPseudoInverse(ConstMatrixView<E> a, double tolerance, MatrixView<E> out);
+ErrorCode ScaledPseudoInverse(const ConstMatrixView<E> &a, double tolerance,
+                              const MatrixView<E> &out);
 
 } // namespace qx
 

@@ -32,8 +32,8 @@ ErrorCode SolveByLU(const ConstMatrixView<E> &a, ConstVectorView<E> b, VectorVie
 // ErrNonFiniteInput, ErrOutOfMemory, ErrSingularMatrix; WarnLowAccuracy where the reciprocal is
 // below eps.
 template <ElementType E>
-ErrorCode SolveSetByLU(ConstMatrixView<E> a, ConstMatrixView<E> b, MatrixView<E> x,
-                       double *reciprocalCondition);
+ErrorCode SolveSetByLU(const ConstMatrixView<E> &a, const ConstMatrixView<E> &b,
+                       const MatrixView<E> &x, double *reciprocalCondition);
 
 // The inverse; out may be a. ErrOutOfMemory, ErrSingularMatrix.
 template <ElementType E>
