@@ -40,7 +40,7 @@ double DesignAndApply() {
     Samples x = truth;
     for (std::size_t i = 0; i < x.size(); ++i)
         x[i] += 0.5 * std::sin(2 * pi * 200 * static_cast<double>(i) / fs);
-    const auto [a, b] = qx::filters::butterworth(40, 4, fs);
+    const auto [a, b, zeros, poles, gain] = qx::filters::butterworth(40, 4, fs);
     return Apart(qx::filters::zero_phase(x, a, b), truth, 100);
 }
 
@@ -152,7 +152,7 @@ double Displacement() {
 
 // The delay of two records of noise, to a sample.
 double Delay() {
-    const Samples noise = qx::noise::gaussian(5000, 7).x;
+    const Samples noise = qx::noise::gaussian(5000, 7);
     const std::span<const double> x(noise.data() + 100, 4000), y(noise.data() + 93, 4000);
     const Samples r = qx::signals::correlate(x, y);
     const auto best = std::max_element(r.begin(), r.end()) - r.begin();
@@ -161,8 +161,8 @@ double Delay() {
 
 // Blocks as they come, with the bits of the whole.
 double StreamingFilter() {
-    const auto [a, b] = qx::filters::elliptic(100, 0.1, 60, 5, fs);
-    const Samples x = qx::noise::gaussian(4000, 3).x;
+    const auto [a, b, zeros, poles, gain] = qx::filters::elliptic(100, 0.1, 60, 5, fs);
+    const Samples x = qx::noise::gaussian(4000, 3);
     const Samples whole = qx::filters::filter_cascade(x, a, b);
     qx::filters::CascadeStream stream(a, b);
     Samples found(x.size());
