@@ -66,8 +66,9 @@ QX_API int32_t Anova1Way_head_2017(QX_IN DBL1D y, QX_IN I32_1D labels, QX_IN con
     Codes: ErrSizeMismatch (the lengths differ), ErrEmptyInput (y is empty), ErrAnovaFewLevels (k is
     below 2 or not below the number of observations), ErrBadSignificance (alpha lies outside [0, 1]
     or is NaN), ErrOutOfMemory (no scratch memory), ErrAnovaFactorEmpty (more labels than k),
-    ErrAnovaNoReplication (fewer), ErrNaNInData (f is NaN: all values are equal, or not all are
-    finite). */
+    ErrAnovaNoReplication (fewer), ErrNaNInData (f is NaN, because all values are equal, or not all
+    are finite).
+    NaN: y refused with ErrNaNInData; alpha refused with ErrBadSignificance. */
 QX_API int32_t Anova1Way_head_2026(QX_IN DBL1D y, QX_IN I32_1D labels, QX_IN const int32_t *k,
                                    double alpha, QX_OUT DBL *ssBetween, QX_OUT DBL *msBetween,
                                    QX_OUT DBL *f, QX_OUT DBL *p, QX_OUT DBL *ssError,

@@ -81,7 +81,8 @@ QX_API int32_t InvChiSquare_head(QX_IN const DBL *p, QX_IN const int32_t *dof, Q
     tail. The larger of probability and survival is 1 less the other. *what: 0 the probability
     P(X <= x); 1 the survival P(X > x); 2 the logarithm of the probability; 3 the logarithm of the
     survival; 4 the density.
-    Codes: ErrInvalidSelector (what is another number), ErrNaNInData (x is NaN). */
+    Codes: ErrInvalidSelector (what is another number), ErrNaNInData (x is NaN).
+    NaN: x refused with ErrNaNInData. */
 QX_API int32_t NormDist2026_head(QX_IN const DBL *x, QX_IN const int32_t *what, QX_OUT DBL *value,
                                  QX_OUT ErrorCode *err);
 
@@ -90,20 +91,23 @@ QX_API int32_t NormDist2026_head(QX_IN const DBL *x, QX_IN const int32_t *what, 
     one. Method: the smaller tail is the incomplete beta integral in the logarithm of t / (1 - t) by
     quadrature, its front in twice the precision (C. Loader's deviance).
     Codes: ErrInvalidSelector (what is another number), ErrTooFewForParameters (dof is not above 0),
-    ErrNaNInData (t is NaN). */
+    ErrNaNInData (t is NaN).
+    NaN: t refused with ErrNaNInData; dof refused with ErrTooFewForParameters. */
 QX_API int32_t TDist2026_head(QX_IN const DBL *t, QX_IN const DBL *dof, QX_IN const int32_t *what,
                               QX_OUT DBL *value, QX_OUT ErrorCode *err);
 
 /** As TDist2026_head, of Fisher's distribution with *n and *d degrees of freedom: 0 for f below 0.
     Codes: ErrInvalidSelector (what is another number), ErrTooFewForParameters (n or d is not above
-    0), ErrNaNInData (f is NaN). */
+    0), ErrNaNInData (f is NaN).
+    NaN: f refused with ErrNaNInData; n, d refused with ErrTooFewForParameters. */
 QX_API int32_t FDist2026_head(QX_IN const DBL *f, QX_IN const DBL *n, QX_IN const DBL *d,
                               QX_IN const int32_t *what, QX_OUT DBL *value, QX_OUT ErrorCode *err);
 
 /** As TDist2026_head, of the chi-square distribution, by the incomplete gamma integral in the
     logarithm of t: 0 for x below 0.
     Codes: ErrInvalidSelector (what is another number), ErrTooFewForParameters (dof is not above 0),
-    ErrNaNInData (x is NaN). */
+    ErrNaNInData (x is NaN).
+    NaN: x refused with ErrNaNInData; dof refused with ErrTooFewForParameters. */
 QX_API int32_t ChiSquare2026_head(QX_IN const DBL *x, QX_IN const DBL *dof,
                                   QX_IN const int32_t *what, QX_OUT DBL *value,
                                   QX_OUT ErrorCode *err);
@@ -113,7 +117,8 @@ QX_API int32_t ChiSquare2026_head(QX_IN const DBL *x, QX_IN const DBL *dof,
     1. A p next to 1 leaves few digits of the other tail: give that one instead, with the other
     *tail.
     Codes: ErrInvalidSelector (tail is another number), ErrProbabilityOutOfRange (p lies outside [0,
-    1] or is NaN). */
+    1] or is NaN).
+    NaN: p refused with ErrProbabilityOutOfRange. */
 QX_API int32_t InvNdist2026_head(QX_IN const DBL *p, QX_IN const int32_t *tail, QX_OUT DBL *x,
                                  QX_OUT ErrorCode *err);
 
@@ -121,20 +126,23 @@ QX_API int32_t InvNdist2026_head(QX_IN const DBL *p, QX_IN const int32_t *tail, 
     whole. Points beyond the largest double are infinite. With few degrees the point has the power
     p^(-1 / dof), so that below 1 degree errors grow as 1 / dof.
     Codes: ErrInvalidSelector (tail is another number), ErrTooFewForParameters (dof is not above 0),
-    ErrProbabilityOutOfRange (p lies outside [0, 1] or is NaN). */
+    ErrProbabilityOutOfRange (p lies outside [0, 1] or is NaN).
+    NaN: p refused with ErrProbabilityOutOfRange; dof refused with ErrTooFewForParameters. */
 QX_API int32_t InvTdist2026_head(QX_IN const DBL *p, QX_IN const int32_t *tail,
                                  QX_IN const DBL *dof, QX_OUT DBL *t, QX_OUT ErrorCode *err);
 
 /** As InvTdist2026_head, of Fisher's distribution; the lower end is 0, which is also the result for
     points below 1e-300.
     Codes: ErrInvalidSelector (tail is another number), ErrTooFewForParameters (n or d is not above
-    0), ErrProbabilityOutOfRange (p lies outside [0, 1] or is NaN). */
+    0), ErrProbabilityOutOfRange (p lies outside [0, 1] or is NaN).
+    NaN: p refused with ErrProbabilityOutOfRange; n, d refused with ErrTooFewForParameters. */
 QX_API int32_t InvFDist2026_head(QX_IN const DBL *p, QX_IN const int32_t *tail, QX_IN const DBL *n,
                                  QX_IN const DBL *d, QX_OUT DBL *f, QX_OUT ErrorCode *err);
 
 /** As InvFDist2026_head, of the chi-square distribution with *dof degrees of freedom.
     Codes: ErrInvalidSelector (tail is another number), ErrTooFewForParameters (dof is not above 0),
-    ErrProbabilityOutOfRange (p lies outside [0, 1] or is NaN). */
+    ErrProbabilityOutOfRange (p lies outside [0, 1] or is NaN).
+    NaN: p refused with ErrProbabilityOutOfRange; dof refused with ErrTooFewForParameters. */
 QX_API int32_t InvChiSquare2026_head(QX_IN const DBL *p, QX_IN const int32_t *tail,
                                      QX_IN const DBL *dof, QX_OUT DBL *x, QX_OUT ErrorCode *err);
 

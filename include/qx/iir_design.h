@@ -162,7 +162,8 @@ QX_API int32_t BesselCoefs90(QX_IN const double *fs, QX_IN const double *fl, QX_
     ErrInvalidSelector (no such type), ErrBadCutoff (the sampling rate or an edge is not above 0,
     not finite, or fl is not below fh), ErrAboveNyquist (an edge is not below half the sampling
     rate), ErrOutOfMemory (the host refuses an array), ErrDegenerateValue (frequencies so far apart
-    that a coefficient leaves the numbers). */
+    that a coefficient leaves the numbers).
+    NaN: fs, fl refused with ErrBadCutoff; fh refused with ErrBadCutoff or in no result. */
 QX_API ErrorCode BWCoefs2026(double fs, double fl, double fh, int32_t order, int32_t type,
                              QX_OUT DBL1D a, QX_OUT DBL1D b, QX_OUT CDB1D zeros, QX_OUT CDB1D poles,
                              QX_OUT double *gain);
@@ -173,7 +174,9 @@ QX_API ErrorCode BWCoefs2026(double fs, double fl, double fh, int32_t order, int
     not finite, or fl is not below fh), ErrAboveNyquist (an edge is not below half the sampling
     rate), ErrRippleNotPositive (the ripple is not above 0), ErrOutOfMemory (the host refuses an
     array), ErrDegenerateValue (frequencies so far apart, or a ripple so small, that a coefficient
-    leaves the numbers). */
+    leaves the numbers).
+    NaN: fs, fl refused with ErrBadCutoff; fh refused with ErrBadCutoff or in no result; ripple
+    refused with ErrRippleNotPositive. */
 QX_API ErrorCode ChebyshevCoefs2026(double fs, double fl, double fh, double ripple, int32_t order,
                                     int32_t type, QX_OUT DBL1D a, QX_OUT DBL1D b,
                                     QX_OUT CDB1D zeros, QX_OUT CDB1D poles, QX_OUT double *gain);
@@ -183,7 +186,9 @@ QX_API ErrorCode ChebyshevCoefs2026(double fs, double fl, double fh, double ripp
     not finite, or fl is not below fh), ErrAboveNyquist (an edge is not below half the sampling
     rate), ErrAttenuationNotPositive (the attenuation is not above 0), ErrOutOfMemory (the host
     refuses an array), ErrDegenerateValue (frequencies so far apart, or an attenuation so large,
-    that a coefficient leaves the numbers). */
+    that a coefficient leaves the numbers).
+    NaN: fs, fl refused with ErrBadCutoff; fh refused with ErrBadCutoff or in no result; attenuation
+    refused with ErrAttenuationNotPositive. */
 QX_API ErrorCode InvChebyshevCoefs2026(double fs, double fl, double fh, double attenuation,
                                        int32_t order, int32_t type, QX_OUT DBL1D a, QX_OUT DBL1D b,
                                        QX_OUT CDB1D zeros, QX_OUT CDB1D poles, QX_OUT double *gain);
@@ -197,7 +202,9 @@ QX_API ErrorCode InvChebyshevCoefs2026(double fs, double fl, double fh, double a
     rate), ErrRippleNotPositive (the ripple is not above 0), ErrAttenuationNotPositive (the
     attenuation is not above 0), ErrRippleAboveAttenuation (the ripple is not below the
     attenuation), ErrOutOfMemory (the host refuses an array), ErrDegenerateValue (frequencies so far
-    apart, or levels so small or large, that a coefficient leaves the numbers). */
+    apart, or levels so small or large, that a coefficient leaves the numbers).
+    NaN: fs, fl refused with ErrBadCutoff; fh refused with ErrBadCutoff or in no result; ripple
+    refused with ErrRippleNotPositive; attenuation refused with ErrAttenuationNotPositive. */
 QX_API ErrorCode EllipticCoefs2026(double fs, double fl, double fh, double ripple,
                                    double attenuation, int32_t order, int32_t type, QX_OUT DBL1D a,
                                    QX_OUT DBL1D b, QX_OUT CDB1D zeros, QX_OUT CDB1D poles,
@@ -210,7 +217,8 @@ QX_API ErrorCode EllipticCoefs2026(double fs, double fl, double fh, double rippl
     ErrInvalidSelector (no such type), ErrBadCutoff (the sampling rate or an edge is not above 0,
     not finite, or fl is not below fh), ErrAboveNyquist (an edge is not below half the sampling
     rate), ErrOutOfMemory (the host refuses an array, or no memory), ErrDegenerateValue (frequencies
-    so far apart that a coefficient leaves the numbers). */
+    so far apart that a coefficient leaves the numbers).
+    NaN: fs, fl refused with ErrBadCutoff; fh refused with ErrBadCutoff or in no result. */
 QX_API ErrorCode BesselCoefs2026(double fs, double fl, double fh, int32_t order, int32_t type,
                                  QX_OUT DBL1D a, QX_OUT DBL1D b, QX_OUT CDB1D zeros,
                                  QX_OUT CDB1D poles, QX_OUT double *gain);

@@ -42,10 +42,12 @@ QX_API ErrorCode CxEqsSetByLUDri_head(QX_IN CDB2D a, QX_IN CDB2D b, QX_OUT CDB2D
     Codes: ErrEmptyInput (a or b is empty), ErrNotSquare (a is not square), ErrSizeMismatch (b has
     not as many rows as a), ErrOutOfMemory (no memory, or the host refused the resize),
     ErrNonFiniteInput (a or b holds NaN or infinity), ErrSingularMatrix (a column has no pivot but
-    0), WarnLowAccuracy (the reciprocal condition is below 2.2e-16: no digit of x is certain). */
+    0), WarnLowAccuracy (the reciprocal condition is below 2.2e-16: no digit of x is certain).
+    NaN: a, b refused with ErrNonFiniteInput. */
 QX_API ErrorCode EqsSetByLU2026_head(QX_IN DBL2D a, QX_IN DBL2D b, QX_OUT DBL2D x,
                                      QX_OUT DBL *reciprocalCondition);
-/** As EqsSetByLU2026_head, for complex data. */
+/** As EqsSetByLU2026_head, for complex data.
+    NaN: a, b refused with ErrNonFiniteInput. */
 QX_API ErrorCode CxEqsSetByLU2026_head(QX_IN CDB2D a, QX_IN CDB2D b, QX_OUT CDB2D x,
                                        QX_OUT DBL *reciprocalCondition);
 
@@ -155,9 +157,11 @@ QX_API ErrorCode CxEqsSetBySVDDri82_head(QX_IN CDB2D a, QX_IN CDB2D b, QX_OUT CD
     Codes: ErrEmptyInput (a or b is empty), ErrSizeMismatch (b has not as many elements as a has
     rows), ErrOutOfMemory (no memory, or the host refused the resize), ErrNonFiniteInput (a or b
     holds NaN or infinity), ErrIterationLimit (the singular values do not converge),
-    WarnRankDeficient (singular values count as 0; x is valid). */
+    WarnRankDeficient (singular values count as 0; x is valid).
+    NaN: a, b refused with ErrNonFiniteInput; tolerance in no result. */
 QX_API ErrorCode GenLinEqs2026_head(QX_IN DBL2D a, QX_IN DBL1D b, QX_OUT DBL1D x, double tolerance);
-/** As GenLinEqs2026_head, for complex data. */
+/** As GenLinEqs2026_head, for complex data.
+    NaN: a, b refused with ErrNonFiniteInput; tolerance in no result. */
 QX_API ErrorCode CxGenLinEqs2026_head(QX_IN CDB2D a, QX_IN CDB1D b, QX_OUT CDB1D x,
                                       double tolerance);
 
@@ -165,10 +169,12 @@ QX_API ErrorCode CxGenLinEqs2026_head(QX_IN CDB2D a, QX_IN CDB1D b, QX_OUT CDB1D
     Codes: ErrEmptyInput (a or b is empty), ErrSizeMismatch (b has not as many rows as a),
     ErrOutOfMemory (no memory, or the host refused the resize), ErrNonFiniteInput (a or b holds NaN
     or infinity), ErrIterationLimit (the singular values do not converge), WarnRankDeficient
-    (singular values count as 0; x is valid). */
+    (singular values count as 0; x is valid).
+    NaN: a, b refused with ErrNonFiniteInput; tolerance in no result. */
 QX_API ErrorCode EqsSetBySVD2026_head(QX_IN DBL2D a, QX_IN DBL2D b, QX_OUT DBL2D x,
                                       double tolerance);
-/** As EqsSetBySVD2026_head, for complex data. */
+/** As EqsSetBySVD2026_head, for complex data.
+    NaN: a, b refused with ErrNonFiniteInput; tolerance in no result. */
 QX_API ErrorCode CxEqsSetBySVD2026_head(QX_IN CDB2D a, QX_IN CDB2D b, QX_OUT CDB2D x,
                                         double tolerance);
 

@@ -171,15 +171,19 @@ QX_API int32_t CxSVDS_head(QX_IN CDB2D a, QX_OUT DBL1D s, QX_OUT ErrorCode *err)
     1970.
     Codes: ErrEmptyInput (a is empty), ErrOutOfMemory (no memory, or the host refuses a resize),
     ErrNonFiniteInput (an element is not finite), ErrIterationLimit (100 iterations were not enough
-    for a value). */
+    for a value).
+    NaN: a refused with ErrNonFiniteInput. */
 QX_API ErrorCode SVD2026_head(QX_IN DBL2D a, int32_t fullSize, QX_OUT DBL2D u, QX_OUT DBL1D s,
                               QX_OUT DBL2D v);
-/** As SVD2026_head, for complex elements: a = u diag(s) v^H. */
+/** As SVD2026_head, for complex elements: a = u diag(s) v^H.
+    NaN: a refused with ErrNonFiniteInput. */
 QX_API ErrorCode CxSVD2026_head(QX_IN CDB2D a, int32_t fullSize, QX_OUT CDB2D u, QX_OUT DBL1D s,
                                 QX_OUT CDB2D v);
-/** As SVD2026_head, the values alone: the same to the bit as with the vectors. */
+/** As SVD2026_head, the values alone: the same to the bit as with the vectors.
+    NaN: a refused with ErrNonFiniteInput. */
 QX_API ErrorCode SVDS2026_head(QX_IN DBL2D a, QX_OUT DBL1D s);
-/** As SVDS2026_head, for complex elements. */
+/** As SVDS2026_head, for complex elements.
+    NaN: a refused with ErrNonFiniteInput. */
 QX_API ErrorCode CxSVDS2026_head(QX_IN CDB2D a, QX_OUT DBL1D s);
 
 /** Hessenberg form h = q^T a q of the square matrix a, in its place, by Householder reflections:

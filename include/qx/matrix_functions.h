@@ -35,9 +35,11 @@ QX_API int32_t CxMatrixExp_head(QX_INOUT CDB2D a, QX_OUT ErrorCode *err);
     computed from them, are infinite or NaN. A. H. Al-Mohy and N. J. Higham, "A new scaling and
     squaring algorithm for the matrix exponential", 2009.
     Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrOutOfMemory (no memory, or
-    the host refuses the resize), ErrNonFiniteInput (an element is not finite). */
+    the host refuses the resize), ErrNonFiniteInput (an element is not finite).
+    NaN: a refused with ErrNonFiniteInput. */
 QX_API ErrorCode MatrixExp2026_head(QX_IN DBL2D a, QX_OUT DBL2D out);
-/** As MatrixExp2026_head, for complex elements. */
+/** As MatrixExp2026_head, for complex elements.
+    NaN: a refused with ErrNonFiniteInput. */
 QX_API ErrorCode CxMatrixExp2026_head(QX_IN CDB2D a, QX_OUT CDB2D out);
 
 /** The principal logarithm of the square matrix a. It is that of the eigenvalues, if the condition
@@ -116,9 +118,11 @@ QX_API int32_t CxPseudoInverse_head(QX_INOUT CDB2D a, QX_IN const double *tolera
     elements are infinite or NaN.
     Codes: ErrEmptyInput (a is empty), ErrOutOfMemory (no memory, or the host refuses the resize),
     ErrNonFiniteInput (an element is not finite), ErrIterationLimit (the singular value iteration
-    did not converge). */
+    did not converge).
+    NaN: a refused with ErrNonFiniteInput; tolerance in no result. */
 QX_API ErrorCode PseudoInverse2026_head(QX_IN DBL2D a, double tolerance, QX_OUT DBL2D out);
-/** As PseudoInverse2026_head, for complex elements. */
+/** As PseudoInverse2026_head, for complex elements.
+    NaN: a refused with ErrNonFiniteInput; tolerance in no result. */
 QX_API ErrorCode CxPseudoInverse2026_head(QX_IN CDB2D a, double tolerance, QX_OUT CDB2D out);
 
 QX_END_DECLS

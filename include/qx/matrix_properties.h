@@ -75,9 +75,11 @@ QX_API int32_t CxNorm_head(QX_IN CDB2D a, QX_IN const int32_t *normType, QX_OUT 
     is max(m, n) times the largest one times 2.2e-16 if negative or NaN. The values are those of
     SVDS2026_head; one that overflows is above any tolerance.
     Codes: ErrEmptyInput (a is empty), ErrNonFiniteInput (a holds NaN or infinity), ErrOutOfMemory
-    (no memory), ErrIterationLimit (the singular values do not converge). */
+    (no memory), ErrIterationLimit (the singular values do not converge).
+    NaN: a refused with ErrNonFiniteInput; tolerance in no result. */
 QX_API ErrorCode Rank2026_head(QX_IN DBL2D a, double tolerance, QX_OUT int32_t *rank);
-/** As Rank2026_head, for complex data. */
+/** As Rank2026_head, for complex data.
+    NaN: a refused with ErrNonFiniteInput; tolerance in no result. */
 QX_API ErrorCode CxRank2026_head(QX_IN CDB2D a, double tolerance, QX_OUT int32_t *rank);
 
 /** Condition number of a matrix of any norm. normType: 0 the quotient of the largest and the
@@ -88,9 +90,11 @@ QX_API ErrorCode CxRank2026_head(QX_IN CDB2D a, double tolerance, QX_OUT int32_t
     is about the number itself times 2.2e-16.
     Codes: ErrEmptyInput (a is empty), ErrNonFiniteInput (a holds NaN or infinity),
     ErrInvalidSelector (normType is not 0 to 3), ErrNotSquare (a is not square, of types 1 to 3),
-    ErrOutOfMemory (no memory), ErrIterationLimit (the singular values do not converge). */
+    ErrOutOfMemory (no memory), ErrIterationLimit (the singular values do not converge).
+    NaN: a refused with ErrNonFiniteInput. */
 QX_API ErrorCode CondNumber2026_head(QX_IN DBL2D a, int32_t normType, QX_OUT DBL *cond);
-/** As CondNumber2026_head, for complex data. */
+/** As CondNumber2026_head, for complex data.
+    NaN: a refused with ErrNonFiniteInput. */
 QX_API ErrorCode CxCondNumber2026_head(QX_IN CDB2D a, int32_t normType, QX_OUT DBL *cond);
 
 /** Norm of a matrix. normType: 0 the largest singular value; 1 the largest column sum of moduli; 2
@@ -99,9 +103,11 @@ QX_API ErrorCode CxCondNumber2026_head(QX_IN CDB2D a, int32_t normType, QX_OUT D
     relative error is a few times max(m, n) eps.
     Codes: ErrEmptyInput (a is empty), ErrNonFiniteInput (a holds NaN or infinity),
     ErrInvalidSelector (normType is not 0 to 3), ErrOutOfMemory (no memory), ErrIterationLimit (the
-    singular values do not converge). */
+    singular values do not converge).
+    NaN: a refused with ErrNonFiniteInput. */
 QX_API ErrorCode Norm2026_head(QX_IN DBL2D a, int32_t normType, QX_OUT DBL *norm);
-/** As Norm2026_head, for complex data. */
+/** As Norm2026_head, for complex data.
+    NaN: a refused with ErrNonFiniteInput. */
 QX_API ErrorCode CxNorm2026_head(QX_IN CDB2D a, int32_t normType, QX_OUT DBL *norm);
 
 /** Sum of the diagonal of a square matrix.

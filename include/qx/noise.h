@@ -125,7 +125,8 @@ QX_API ErrorCode BinomialNoiseH(QX_OUT U32_1D x, int32_t n, int32_t trials, doub
 /** Uniform white noise: x[i] = amplitude (2 u - 1), n samples in (-amplitude, amplitude); u is
     (m + 1/2) / 2^52 with m of 52 bits, so that the samples are symmetric and none is 0.
     Codes: ErrEmptyInput (n is below 1), ErrIndexOutOfRange (the position is negative, no whole
-    number, or above 2^53 - n), ErrOutOfMemory (the host refused the resize). */
+    number, or above 2^53 - n), ErrOutOfMemory (the host refused the resize).
+    NaN: amplitude in all results; position refused with ErrIndexOutOfRange. */
 QX_API ErrorCode White2026(QX_OUT DBL1D x, int32_t n, double amplitude, int32_t key, int32_t stream,
                            double position);
 /** Gaussian white noise of mean 0 and standard deviation sigma: the quantile of a uniform number,
@@ -133,7 +134,8 @@ QX_API ErrorCode White2026(QX_OUT DBL1D x, int32_t n, double amplitude, int32_t 
     normal distribution", 1988, to 1e-15 of itself. A tail below 2^-12 has 64 bits more, so that
     samples beyond 8.2 sigma occur as often as they should, to 12.5 sigma.
     Codes: ErrEmptyInput (n is below 1), ErrIndexOutOfRange (the position is negative, no whole
-    number, or above 2^53 - n), ErrOutOfMemory (the host refused the resize). */
+    number, or above 2^53 - n), ErrOutOfMemory (the host refused the resize).
+    NaN: sigma in all results; position refused with ErrIndexOutOfRange. */
 QX_API ErrorCode Gauss2026(QX_OUT DBL1D x, int32_t n, double sigma, int32_t key, int32_t stream,
                            double position);
 /** Gamma noise of any shape above 0, with density x^(shape - 1) exp(-x) / Gamma(shape): by
@@ -141,7 +143,8 @@ QX_API ErrorCode Gauss2026(QX_OUT DBL1D x, int32_t n, double sigma, int32_t key,
     2000. Below a shape of 0.002 some samples underflow to 0.
     Codes: ErrInvalidSelector (the shape is not above 0, or not finite), ErrEmptyInput (n is below
     1), ErrIndexOutOfRange (the position is negative, no whole number, or above 2^53 - n),
-    ErrOutOfMemory (the host refused the resize). */
+    ErrOutOfMemory (the host refused the resize).
+    NaN: shape refused with ErrInvalidSelector; position refused with ErrIndexOutOfRange. */
 QX_API ErrorCode Gamma2026(QX_OUT DBL1D x, int32_t n, double shape, int32_t key, int32_t stream,
                            double position);
 /** Poisson noise of means to 1e15: below a mean of 10 by the sum of probabilities, above by
@@ -150,7 +153,8 @@ QX_API ErrorCode Gamma2026(QX_OUT DBL1D x, int32_t n, double shape, int32_t key,
     binomial probabilities", 2000, which keep their digits at any mean.
     Codes: ErrInvalidSelector (the mean is not from 0 to 1e15), ErrEmptyInput (n is below 1),
     ErrIndexOutOfRange (the position is negative, no whole number, or above 2^53 - n),
-    ErrOutOfMemory (the host refused the resize). */
+    ErrOutOfMemory (the host refused the resize).
+    NaN: mean refused with ErrInvalidSelector; position refused with ErrIndexOutOfRange. */
 QX_API ErrorCode Poisson2026(QX_OUT DBL1D x, int32_t n, double mean, int32_t key, int32_t stream,
                              double position);
 /** Binomial noise: numbers of successes in `trials` trials of probability p, trials a whole number
@@ -158,7 +162,8 @@ QX_API ErrorCode Poisson2026(QX_OUT DBL1D x, int32_t n, double mean, int32_t key
     1993.
     Codes: ErrInvalidSelector (trials is not a whole number of 0 to 2^52, or p is not from 0 to 1),
     ErrEmptyInput (n is below 1), ErrIndexOutOfRange (the position is negative, no whole number, or
-    above 2^53 - n), ErrOutOfMemory (the host refused the resize). */
+    above 2^53 - n), ErrOutOfMemory (the host refused the resize).
+    NaN: trials, p refused with ErrInvalidSelector; position refused with ErrIndexOutOfRange. */
 QX_API ErrorCode Binomial2026(QX_OUT DBL1D x, int32_t n, double trials, double p, int32_t key,
                               int32_t stream, double position);
 

@@ -60,9 +60,11 @@ QX_API int32_t CxPolyRoots_head(QX_INOUT CDB1D coef, QX_IN const int32_t *maxIte
     degree 200.
     Codes: ErrEmptyInput (coef is empty), ErrBadCoefficients (a coefficient is not finite, or the
     polynomial is constant), ErrOutOfMemory (no memory, or the host refuses an output), ErrOverflow
-    (a root is beyond the range of double), ErrIterationLimit (600 sweeps were not enough). */
+    (a root is beyond the range of double), ErrIterationLimit (600 sweeps were not enough).
+    NaN: coef refused with ErrBadCoefficients. */
 QX_API ErrorCode PolyRoots2026_head(QX_IN DBL1D coef, QX_OUT CDB1D roots, QX_OUT DBL1D radii);
-/** As PolyRoots2026_head, for complex coefficients, without pairs. */
+/** As PolyRoots2026_head, for complex coefficients, without pairs.
+    NaN: coef refused with ErrBadCoefficients. */
 QX_API ErrorCode CxPolyRoots2026_head(QX_IN CDB1D coef, QX_OUT CDB1D roots, QX_OUT DBL1D radii);
 
 /** Distinct roots of a real polynomial and their multiplicities: the structure by repeated greatest

@@ -54,18 +54,22 @@ QX_API ErrorCode RiffleIntNum_head(QX_OUT I32_1D indices, int32_t count, int32_t
     interval", 2019, from 64 bits each. A failure empties both arrays.
     Codes: ErrEmptyInput (x is empty), ErrIndexOutOfRange (the position is negative, no whole
     number, or above 2^53 less the number of elements), ErrOutOfMemory (the host refused the
-    resize). */
+    resize).
+    NaN: x in some results; position refused with ErrIndexOutOfRange. */
 QX_API ErrorCode RiffleArrayDBL2026_head(QX_INOUT DBL1D x, QX_OUT I32_1D indices, int32_t key,
                                          int32_t stream, double position);
-/** As RiffleArrayDBL2026_head, for complex elements. */
+/** As RiffleArrayDBL2026_head, for complex elements.
+    NaN: x in some results; position refused with ErrIndexOutOfRange. */
 QX_API ErrorCode RiffleArrayCDB2026_head(QX_INOUT CDB1D x, QX_OUT I32_1D indices, int32_t key,
                                          int32_t stream, double position);
-/** As RiffleArrayDBL2026_head, for integers. */
+/** As RiffleArrayDBL2026_head, for integers.
+    NaN: position refused with ErrIndexOutOfRange. */
 QX_API ErrorCode RiffleArrayInt2026_head(QX_INOUT I32_1D x, QX_OUT I32_1D indices, int32_t key,
                                          int32_t stream, double position);
 /** A random order of 0 to count - 1, as RiffleArrayDBL2026_head makes it.
     Codes: ErrEmptyInput (count is below 1), ErrIndexOutOfRange (the position is negative, no whole
-    number, or above 2^53 - count), ErrOutOfMemory (the host refused the resize). */
+    number, or above 2^53 - count), ErrOutOfMemory (the host refused the resize).
+    NaN: position refused with ErrIndexOutOfRange. */
 QX_API ErrorCode RiffleIntNum2026_head(QX_OUT I32_1D indices, int32_t count, int32_t key,
                                        int32_t stream, double position);
 

@@ -248,7 +248,7 @@ TEST(Results, OfEveryKind) {
 TEST(Results, OfRandomNumbersGoOn) {
     const Samples whole = qx::noise::uniform(100, 5);
     Samples both = qx::noise::uniform(40, 5);
-    const Samples rest = qx::noise::uniform(60, 5, 0, 40);
+    const Samples rest = qx::noise::uniform(60, 5, 1.0, 0, 40);
     both.insert(both.end(), rest.begin(), rest.end());
     EXPECT_TRUE(SameBits<double>(both, whole));
 }
