@@ -181,10 +181,9 @@ void SolveSets() {
                 factors = a;
                 other = b;
                 const double norm = dlange("1", &n, &n, factors.data(), &n, work.data());
-                dgesv(&n, &sides, factors.data(), &n, pivots.data(), other.data(), &n,
-                             &info);
+                dgesv(&n, &sides, factors.data(), &n, pivots.data(), other.data(), &n, &info);
                 dgecon("1", &n, factors.data(), &n, &norm, &reciprocal, work.data(),
-                              integers.data(), &info);
+                       integers.data(), &info);
             });
     }
     ratios.summary("LAPACK dgesv and dgecon");

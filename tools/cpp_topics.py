@@ -81,7 +81,7 @@ DEFAULTS = {
     "calculus": {"dt": "1.0", "rule": 1, "initial": "{}", "final": "{}"},
     "calculus.derivative": {"rule": 0},
     "stats.mode": {"intervals": "0"},
-    "stats": {"alpha": "0.05", "significance": "0.05", "what": "0", "tail": "0"},
+    "stats": {"alpha": "0.05", "significance": "0.05", "what": 0, "tail": 0},
     "measure": {"t0": "0.0", "dt": "1.0", "limit": 1, "bins": "256", "method": 0, "hist": "{0, 256}", "order": 0,
                 "centre": "-1.0", "halfWidth": "0.0", "hysteresis": "0.0", "slope": 0, "start": "0", "holdoff": "0",
                 "state": "{}", "polarity": 1, "partial": "0", "fundamental": "0.0", "fullScale": "0.0"},

@@ -78,7 +78,7 @@ QX_API int32_t InvChiSquare_head(QX_IN const DBL *p, QX_IN const int32_t *dof, Q
 
 /** A value of the standard normal distribution at *x, within 3 eps and down to the smallest numbers:
     exp(-x^2 / 2), its square in twice the precision, times rational functions for the ratio to the
-    tail. The larger of probability and survival is 1 less the other. *what: 0 the probability
+    tail. The larger of probability and survival is 1 less the other. what: 0 the probability
     P(X <= x); 1 the survival P(X > x); 2 the logarithm of the probability; 3 the logarithm of the
     survival; 4 the density.
     Codes: ErrInvalidSelector (what is another number), ErrNaNInData (x is NaN).
@@ -113,7 +113,7 @@ QX_API int32_t ChiSquare2026_head(QX_IN const DBL *x, QX_IN const DBL *dof,
                                   QX_OUT ErrorCode *err);
 
 /** The point below which, or above which, the standard normal distribution has the probability *p:
-    Newton's method for the logarithm of the tail. *tail: 0 below; 1 above. Infinite for p of 0 and
+    Newton's method for the logarithm of the tail. tail: 0 below; 1 above. Infinite for p of 0 and
     1. A p next to 1 leaves few digits of the other tail: give that one instead, with the other
     *tail.
     Codes: ErrInvalidSelector (tail is another number), ErrProbabilityOutOfRange (p lies outside [0,

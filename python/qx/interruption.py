@@ -7,11 +7,13 @@ ends the process where that takes too long.
 
 import atexit
 import contextlib
+import ctypes
 import os
 import signal
 import socket
 import sys
 import threading
+import time
 
 from .outputs import forget_all
 
@@ -47,6 +49,9 @@ class Watch:
             threading.Event().wait(SECONDS)
             forget_all()
             self._tell()
+            ctypes.CDLL(None).signal(signal.SIGINT, None)  # Python's own is for the main thread alone
+            os.kill(os.getpid(), signal.SIGINT)
+            time.sleep(0.1)
             os.kill(os.getpid(), signal.SIGKILL)
 
     def _tell(self):

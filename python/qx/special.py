@@ -337,7 +337,7 @@ def expn(n: ArrayLike, x: ArrayLike) -> Any:
     --------
     >>> import qx
     >>> qx.special.expn(1, 1.0)
-    0.2193839343955205
+    0.2193839343955203
     """
     return core.expn(x, n)
 

@@ -82,7 +82,8 @@ class Server(InFolder):
         path, port = served.parts.path, served.parts.port
         self.assertEqual(served.parts.hostname, "127.0.0.1")
         self.assertEqual(served.get(path, f"localhost:{port}")[0], 200)
-        for asked, host in (("/", None), (path[:-2] + "x/", None), ("/x/0/data", None), (path, "evil.example"),
+        other = path[:-2] + ("y/" if path[-2] == "x" else "x/")
+        for asked, host in (("/", None), (other, None), ("/x/0/data", None), (path, "evil.example"),
                             (path, f"evil.example:{port}"), (path, "127.0.0.1"), (path, f"127.0.0.1:{port + 1}")):
             with self.subTest(asked=asked, host=host):
                 self.assertEqual(served.get(asked, host)[0], 403)

@@ -139,7 +139,7 @@ def hyperbolic(folder):
 
 
 if __name__ == "__main__":
-    made = {"error_function": error_function, "exponential": exponential, "dilogarithm": dilogarithm, "trigonometric": trigonometric,
-            "hyperbolic": hyperbolic}
+    made = {"error_function": error_function, "exponential": exponential, "dilogarithm": dilogarithm,
+            "trigonometric": trigonometric, "hyperbolic": hyperbolic}
     for name in sys.argv[2:] or made:
         made[name](sys.argv[1] + "/src/special/tables/")
