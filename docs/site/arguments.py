@@ -29,6 +29,7 @@ TEXTS = {
                   "yState": "The state of the output, the results before this block."},
     "fir_design": {"design": "The design of both stages."},
     "generalised_problems": {"vectors": "The eigenvectors, one to a column."},
+    "iir_design": {"gain": "The factor of the product of z - zeros[k] over that of z - poles[k]."},
     "interpolation": {
         "firstSlope": "The slope at the first point.", "lastSlope": "The slope at the last point.",
         "secondDerivatives": "The second derivatives at the points.", "x": "Where the samples are.",
