@@ -2,7 +2,7 @@
 
 TEXTS = {
     "anova": {
-        "chiSquare": "The statistic.", "p": "The probability of a larger statistic.",
+        "chiSquare": "The statistic.",
         "critical": "The values that f exceeds with probability significance, one to a source.",
         "fCritical": "The value that f exceeds with probability alpha.",
         "denominatorDegrees": "The degrees of freedom of the denominator of each f.",

@@ -145,11 +145,13 @@ def clipped(sentence, pattern, enough=70):
 
 
 def texts_of(entry):
-    """The texts that describe an export: its own, those it takes over, and that of its header."""
+    """The texts that describe an export: its own, those it takes over, and that of its header. What is said of
+    codes and of NaN does not describe its arguments."""
     entries = library().entries
     family = next(one for one in library().catalogue["families"] if one["name"] == entry["family"])
     texts = [entry["documentation"], *(entries[name]["documentation"] for name in entry["inherited"])]
-    return [*(without_codes(text)[0] for text in texts), family["introduction"]]
+    described = (re.split(r"(?:^|\n)\s*NaN: ", text)[0] for text in texts)
+    return [*(without_codes(text)[0] for text in described), family["introduction"]]
 
 
 def meaning(entry, argument):

@@ -87,9 +87,9 @@ TYPED_TEST(LanePairsTest, TakeThePairsThatTheirNamesSay) {
     const L pairs = qx::LoadPairs<n>(from, 2), each = qx::LoadEach<n>(from, 3);
     StorePairs(pairs, to, 5);
     for (int i = 0; i < n; ++i) {
-        EXPECT_EQ(pairs[i], from[i / 2][2 + i % 2]);
-        EXPECT_EQ(to[i / 2][5 + i % 2], pairs[i]);
-        EXPECT_EQ(each[i], from[i][3]);
+        EXPECT_EQ(pairs[i], double{from[i / 2][2 + i % 2]});
+        EXPECT_EQ(double{to[i / 2][5 + i % 2]}, pairs[i]);
+        EXPECT_EQ(each[i], double{from[i][3]});
     }
 }
 

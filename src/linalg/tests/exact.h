@@ -27,7 +27,7 @@ public:
             a_[static_cast<std::size_t>(i)] = {a[i].re, a[i].im};
     }
     static Exact Identity(int n) { return Diagonal(n, std::vector<double>(n, 1.0).data()); }
-    static Exact Diagonal(int n, const double *d) {
+    static Exact Diagonal(int n, const DBL *d) {
         Exact result(n, n);
         for (int i = 0; i < n; ++i)
             result(i, i) = d[i];
