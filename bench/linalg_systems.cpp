@@ -180,10 +180,10 @@ void SolveSets() {
                 int32_t info;
                 factors = a;
                 other = b;
-                const double norm = dlange("1", &n, &n, factors.data(), &n, work.data());
+                const double norm = dlange("1", &n, &n, factors.data(), &n, work.data(), 1);
                 dgesv(&n, &sides, factors.data(), &n, pivots.data(), other.data(), &n, &info);
                 dgecon("1", &n, factors.data(), &n, &norm, &reciprocal, work.data(),
-                       integers.data(), &info);
+                       integers.data(), &info, 1);
             });
     }
     ratios.summary("LAPACK dgesv and dgecon");

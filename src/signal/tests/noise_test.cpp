@@ -681,9 +681,10 @@ TEST(CounterNoise, FollowsItsDiscreteDistributions) {
     struct Trials {
         double trials, p;
     };
-    for (const auto &[trials, p] :
+    for (const Trials &of :
          {Trials{1, 0.25}, Trials{40, 0.2}, Trials{40, 0.8}, Trials{40, 0.26}, Trials{25, 0.5},
           Trials{3000, 0.3}, Trials{1e6, 1e-5}, Trials{1e6, 0.9999}}) {
+        const double trials = of.trials, p = of.p;
         const Samples k = Of([&](DBL1D x) { return Binomial2026(x, n, trials, p, 9, 2, 0.0); });
         const auto lnProbability = [&](double j) {
             return std::lgamma(trials + 1) - std::lgamma(j + 1) - std::lgamma(trials - j + 1) +
