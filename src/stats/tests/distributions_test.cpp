@@ -8,6 +8,7 @@
 #include <bit>
 #include <cmath>
 #include <limits>
+#include <numbers>
 #include <string>
 #include <vector>
 
@@ -247,12 +248,13 @@ TEST(DistributionTails, ReachLimitsOfTheDegrees) {
             << "x / 3.5 is rounded";
     }
     // Cauchy's distribution, far out: 1 / (pi t), and beyond the range.
-    EXPECT_NEAR(Revised("t", {1e200, 1.0}, 1), 1e-200 / M_PI, 4e-200 * eps);
-    EXPECT_NEAR(Revised("it", {1e-200, 1.0}, 1), 1e200 / M_PI, 4e200 * eps);
+    EXPECT_NEAR(Revised("t", {1e200, 1.0}, 1), 1e-200 / std::numbers::pi, 4e-200 * eps);
+    EXPECT_NEAR(Revised("it", {1e-200, 1.0}, 1), 1e200 / std::numbers::pi, 4e200 * eps);
     EXPECT_EQ(Revised("it", {1e-300, 0.5}, 1), inf);
     EXPECT_EQ(Revised("ichi2", {1e-300, 0.01}, 0), 0);
     // The quarter of a large number of degrees at the mean of the distribution.
-    EXPECT_NEAR(Revised("chi2", {1e10, 1e10}, 0), 0.5 + 1 / (3 * std::sqrt(M_PI * 1e10)), 1e-14);
+    EXPECT_NEAR(Revised("chi2", {1e10, 1e10}, 0),
+                0.5 + 1 / (3 * std::sqrt(std::numbers::pi * 1e10)), 1e-14);
 }
 
 TEST(DistributionTails, EdgesAndCodes) {
