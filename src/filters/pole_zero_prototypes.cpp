@@ -39,8 +39,14 @@ void ButterworthPoles(int32_t n, PoleZeroSections &sections) {
     }
 }
 
+// For x above 0. The system's own is not the module's, and has other bits elsewhere.
+double Asinh(double x) {
+    return x > 1e8 ? std::log(x) + std::log(2.0)
+                   : std::log1p(x + x * x / (1.0 + std::sqrt(1.0 + x * x)));
+}
+
 void ChebyshevPoles(int32_t n, double ripple, PoleZeroSections &sections) {
-    const double u = std::asinh(1.0 / std::sqrt(ExcessPower(ripple))) / n;
+    const double u = Asinh(1.0 / std::sqrt(ExcessPower(ripple))) / n;
     const double sh = std::sinh(u), ch = std::cosh(u);
     if (n % 2 != 0)
         sections.add(-sh);
@@ -52,7 +58,7 @@ void ChebyshevPoles(int32_t n, double ripple, PoleZeroSections &sections) {
 
 // Reciprocals of the poles of a Chebyshev filter.
 void InvChebyshevPoles(int32_t n, double attenuation, PoleZeroSections &sections) {
-    const double u = std::asinh(std::sqrt(ExcessPower(attenuation))) / n;
+    const double u = Asinh(std::sqrt(ExcessPower(attenuation))) / n;
     const double sh = std::sinh(u), ch = std::cosh(u);
     if (n % 2 != 0)
         sections.add(-1.0 / sh);
