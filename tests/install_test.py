@@ -9,9 +9,10 @@ import re
 import shutil
 import subprocess
 import sys
-import tempfile
 import unittest
 from pathlib import Path
+
+from in_a_folder import InAFolder, run
 
 SOURCE, BUILD = (Path(name).resolve() for name in sys.argv[1:3])
 del sys.argv[1:3]
@@ -19,21 +20,7 @@ EXAMPLES = SOURCE / "examples"
 CONSUMER = SOURCE / "tests/install"
 
 
-def run(*command, **more):
-    """The output of a command; a failure shows all of it."""
-    ran = subprocess.run([str(part) for part in command], text=True, stdout=subprocess.PIPE,
-                         stderr=subprocess.STDOUT, **more)
-    if ran.returncode:
-        raise AssertionError(f"{' '.join(map(str, command))}\n{ran.stdout[-3000:]}")
-    return ran.stdout
-
-
-class Using(unittest.TestCase):
-    def setUp(self):
-        folder = tempfile.TemporaryDirectory()
-        self.addCleanup(folder.cleanup)
-        self.folder = Path(folder.name)
-
+class Using(InAFolder):
     def holds(self, output):
         self.assertRegex(output, r"mean +5(?s:.*)ErrOrderNotPositive")
 

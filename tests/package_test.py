@@ -9,10 +9,11 @@ import shutil
 import subprocess
 import sys
 import tarfile
-import tempfile
 import unittest
 import zipfile
 from pathlib import Path
+
+from in_a_folder import InAFolder, run
 
 SOURCE = Path(sys.argv.pop(1)).resolve()
 PACKAGES = SOURCE / "build/package"
@@ -44,22 +45,6 @@ int start(void) {
     return status.status == 1 && status.code < 0 ? 42 : 2;
 }
 """
-
-
-def run(*command, **more):
-    """The output of a command; a failure shows all of it."""
-    ran = subprocess.run([str(part) for part in command], text=True, stdout=subprocess.PIPE,
-                         stderr=subprocess.STDOUT, **more)
-    if ran.returncode:
-        raise AssertionError(f"{' '.join(map(str, command))}\n{ran.stdout[-3000:]}")
-    return ran.stdout
-
-
-class InAFolder(unittest.TestCase):
-    def setUp(self):
-        folder = tempfile.TemporaryDirectory()
-        self.addCleanup(folder.cleanup)
-        self.folder = Path(folder.name)
 
 
 @unittest.skipUnless(ALL, "builds for Windows: ./test --all")

@@ -25,33 +25,44 @@ ErrorCode UpperTail(Distribution distribution, double *p) {
     return status;
 }
 
+// The sums of a table of counts, over its rows, its columns and all of it.
+struct TableSums {
+    ErrorCode add(const ConstMatrixView<ElementType::I32> &table) {
+        if (const ErrorCode status =
+                memory.take(Sized(rows, table.rows()), Sized(cols, table.cols())))
+            return status;
+        Fill(rows.data(), rows.size(), 0.0);
+        Fill(cols.data(), cols.size(), 0.0);
+        for (int32_t i = 0; i < table.rows(); ++i)
+            for (int32_t j = 0; j < table.cols(); ++j) {
+                const int32_t cell = table(i, j);
+                if (cell < 0)
+                    return ErrTableNegativeSize;
+                rows[i] += cell;
+                cols[j] += cell;
+                total += cell;
+            }
+        return 0;
+    }
+
+    ScratchParts memory;
+    RealVector rows, cols;
+    double total = 0.0;
+};
+
 } // namespace
 
 ErrorCode ContingencyTest(const ConstMatrixView<ElementType::I32> &table, DBL *chiSquare, DBL *p) {
     const int32_t rows = table.rows(), cols = table.cols();
     if (rows < 2 || cols < 2)
         return ErrTableTooSmall;
-    RealVector rowSum, colSum;
-    ScratchParts sums;
-    if (const ErrorCode status = sums.take(Sized(rowSum, rows), Sized(colSum, cols)))
+    TableSums sums;
+    if (const ErrorCode status = sums.add(table))
         return status;
-    Fill(rowSum.data(), rows, 0.0);
-    Fill(colSum.data(), cols, 0.0);
-    double total = 0.0;
-    for (int32_t i = 0; i < rows; ++i)
-        for (int32_t j = 0; j < cols; ++j) {
-            const int32_t cell = table(i, j);
-            if (cell < 0)
-                return ErrTableNegativeSize;
-            rowSum[i] += cell;
-            colSum[j] += cell;
-            total += cell;
-        }
-
     double statistic = 0.0;
     for (int32_t i = 0; i < rows; ++i)
         for (int32_t j = 0; j < cols; ++j) {
-            const double expected = colSum[j] * rowSum[i] / total;
+            const double expected = sums.cols[j] * sums.rows[i] / sums.total;
             const double difference = table(i, j) - expected;
             statistic += difference * difference / expected;
         }
@@ -63,7 +74,7 @@ ErrorCode ContingencyTest(const ConstMatrixView<ElementType::I32> &table, DBL *c
         UpperTail([&](double *below) { return ChiSquareCDF(statistic, dof, below); }, &upper);
     if (status == 0)
         *p = upper;
-    return Merge(status, sums.release());
+    return Merge(status, sums.memory.release());
 }
 
 ErrorCode OneWayAnova(ConstRealVector y, ConstVectorView<ElementType::I32> labels, int32_t k,
@@ -113,38 +124,24 @@ ErrorCode ContingencyTail(const ConstMatrixView<ElementType::I32> &table, DBL *c
     const int32_t rows = table.rows(), cols = table.cols();
     if (rows < 2 || cols < 2)
         return ErrTableTooSmall;
-    Scratch<ElementType::DBL> sums;
-    if (const ErrorCode status = sums.allocate(int64_t{rows} + cols))
+    TableSums sums;
+    if (const ErrorCode status = sums.add(table))
         return status;
-    DBL *rowSum = sums.data();
-    DBL *colSum = sums.data() + rows;
-    Fill(rowSum, std::ptrdiff_t{rows} + cols, 0.0);
-    double total = 0.0;
-    for (int32_t i = 0; i < rows; ++i)
-        for (int32_t j = 0; j < cols; ++j) {
-            const int32_t cell = table(i, j);
-            if (cell < 0)
-                return ErrTableNegativeSize;
-            rowSum[i] += cell;
-            colSum[j] += cell;
-            total += cell;
-        }
-
     Extended statistic = {0.0, 0.0};
     for (int32_t i = 0; i < rows; ++i)
         for (int32_t j = 0; j < cols; ++j) {
             const int32_t cell = table(i, j);
-            const Extended product = ExactProduct(rowSum[i], colSum[j]);
-            const Extended difference = ExactProduct(cell, total) - product;
+            const Extended product = ExactProduct(sums.rows[i], sums.cols[j]);
+            const Extended difference = ExactProduct(cell, sums.total) - product;
             statistic = statistic + difference * difference / product;
         }
-    statistic = statistic / Extended{total, 0.0};
+    statistic = statistic / Extended{sums.total, 0.0};
     *chiSquare = statistic.high;
     // An empty row or column makes the statistic NaN, which has no tail.
     const double dof = static_cast<double>(rows - 1) * (cols - 1);
     *p = std::isnan(*chiSquare) ? kNaN
                                 : ChiSquareValue(*chiSquare, dof, DistributionValue::Survival);
-    return sums.release();
+    return sums.memory.release();
 }
 
 namespace {

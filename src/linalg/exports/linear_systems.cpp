@@ -93,16 +93,6 @@ Outcome SolveLeastSquares(In<Matrix> a, In<Vector> b, Out<Vector> x, double tole
         SolveBySVD<elementOf<Matrix>>(a.view(), AsColumn(b.view()), AsColumn(x.view()), tolerance));
 }
 
-template <class Matrix>
-Outcome SolveLeastSquaresSet(In<Matrix> a, In<Matrix> b, Out<Matrix> x, double tolerance) {
-    if (const Outcome bad = FirstFailed(
-            {{a.isEmpty() || b.isEmpty(), ErrEmptyInput}, {b.rows() != a.rows(), ErrSizeMismatch}}))
-        return bad;
-    if (const Outcome bad = x.resize(a.cols(), b.cols()))
-        return bad;
-    return SolveBySVD<elementOf<Matrix>>(a.view(), b.view(), x.view(), tolerance);
-}
-
 template <class Matrix, class Vector>
 Outcome SolveLeastSquares2026(In<Matrix> a, In<Vector> b, Out<Vector> x, double tolerance) {
     if (const Outcome bad = FirstFailed(
@@ -113,14 +103,15 @@ Outcome SolveLeastSquares2026(In<Matrix> a, In<Vector> b, Out<Vector> x, double 
     return SolveScaledBySVD<elementOf<Matrix>>(a.view(), AsColumn(b.view()), AsColumn(x.view()),
                                                tolerance);
 }
-template <class Matrix>
-Outcome SolveLeastSquaresSet2026(In<Matrix> a, In<Matrix> b, Out<Matrix> x, double tolerance) {
+// `Solve` is SolveBySVD of the elements, or SolveScaledBySVD for the revision.
+template <class Matrix, auto Solve>
+Outcome SolveLeastSquaresSet(In<Matrix> a, In<Matrix> b, Out<Matrix> x, double tolerance) {
     if (const Outcome bad = FirstFailed(
             {{a.isEmpty() || b.isEmpty(), ErrEmptyInput}, {b.rows() != a.rows(), ErrSizeMismatch}}))
         return bad;
     if (const Outcome bad = x.resize(a.cols(), b.cols()))
         return bad;
-    return SolveScaledBySVD<elementOf<Matrix>>(a.view(), b.view(), x.view(), tolerance);
+    return Solve(a.view(), b.view(), x.view(), tolerance);
 }
 
 // The memory that is shown, with `more` elements than the plain method needs.
@@ -345,10 +336,12 @@ ErrorCode CxEqsSetBySVDDri_head(CDB2D a, CDB2D b, CDB2D x) {
     return CxEqsSetBySVDDri82_head(a, b, x, -1.0);
 }
 ErrorCode EqsSetBySVDDri82_head(DBL2D a, DBL2D b, DBL2D x, double tolerance) {
-    return Returned(qx::SolveLeastSquaresSet<DBL2D>, a, b, x, tolerance);
+    return Returned(qx::SolveLeastSquaresSet<DBL2D, qx::SolveBySVD<qx::elementOf<DBL2D>>>, a, b, x,
+                    tolerance);
 }
 ErrorCode CxEqsSetBySVDDri82_head(CDB2D a, CDB2D b, CDB2D x, double tolerance) {
-    return Returned(qx::SolveLeastSquaresSet<CDB2D>, a, b, x, tolerance);
+    return Returned(qx::SolveLeastSquaresSet<CDB2D, qx::SolveBySVD<qx::elementOf<CDB2D>>>, a, b, x,
+                    tolerance);
 }
 ErrorCode GenLinEqs2026_head(DBL2D a, DBL1D b, DBL1D x, double tolerance) {
     return Returned(qx::SolveLeastSquares2026<DBL2D, DBL1D>, a, b, x, tolerance);
@@ -357,10 +350,12 @@ ErrorCode CxGenLinEqs2026_head(CDB2D a, CDB1D b, CDB1D x, double tolerance) {
     return Returned(qx::SolveLeastSquares2026<CDB2D, CDB1D>, a, b, x, tolerance);
 }
 ErrorCode EqsSetBySVD2026_head(DBL2D a, DBL2D b, DBL2D x, double tolerance) {
-    return Returned(qx::SolveLeastSquaresSet2026<DBL2D>, a, b, x, tolerance);
+    return Returned(qx::SolveLeastSquaresSet<DBL2D, qx::SolveScaledBySVD<qx::elementOf<DBL2D>>>, a,
+                    b, x, tolerance);
 }
 ErrorCode CxEqsSetBySVD2026_head(CDB2D a, CDB2D b, CDB2D x, double tolerance) {
-    return Returned(qx::SolveLeastSquaresSet2026<CDB2D>, a, b, x, tolerance);
+    return Returned(qx::SolveLeastSquaresSet<CDB2D, qx::SolveScaledBySVD<qx::elementOf<CDB2D>>>, a,
+                    b, x, tolerance);
 }
 
 int32_t EqsByCholeskyDri_head(DBL2D a, DBL1D b, DBL1D x, ErrorCode *err) {

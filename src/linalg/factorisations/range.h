@@ -8,6 +8,16 @@
 
 namespace qx {
 
+// a becomes a / 2^exponent: in two steps, since one factor could overflow.
+template <ElementType E>
+void DivideByPower(const MatrixView<E> &a, int exponent) {
+    const double factor = std::ldexp(1.0, -exponent / 2);
+    const double rest = std::ldexp(1.0, -exponent - (-exponent / 2));
+    for (int32_t i = 0; i < a.rows(); ++i)
+        for (int32_t j = 0; j < a.cols(); ++j)
+            a(i, j) = a(i, j) * factor * rest;
+}
+
 // Multiplies a matrix of extreme elements by a power of two so that squares of them neither
 // overflow nor vanish, and returns the exponent that takes its values back. No digit changes.
 // Matrices of ordinary size are left alone; which are too small, the caller says.
@@ -23,12 +33,7 @@ int BringIntoRange(const MatrixView<E> &a, double tooSmall) {
     std::frexp(largest, &exponent);
     // Large values stay large, for there are tests against absolute numbers.
     exponent -= largest > 1.0 ? 200 : 0;
-    // In two steps, since one factor could overflow.
-    const double factor = std::ldexp(1.0, -exponent / 2);
-    const double rest = std::ldexp(1.0, -exponent - (-exponent / 2));
-    for (int32_t i = 0; i < a.rows(); ++i)
-        for (int32_t j = 0; j < a.cols(); ++j)
-            a(i, j) = a(i, j) * factor * rest;
+    DivideByPower<E>(a, exponent);
     return exponent;
 }
 
@@ -47,12 +52,7 @@ int ScaleTo(const MatrixView<E> &a, int target) {
     int exponent;
     std::frexp(largest, &exponent);
     exponent -= target;
-    // In two steps, since one factor could overflow.
-    const double factor = std::ldexp(1.0, -exponent / 2);
-    const double rest = std::ldexp(1.0, -exponent - (-exponent / 2));
-    for (int32_t i = 0; i < a.rows(); ++i)
-        for (int32_t j = 0; j < a.cols(); ++j)
-            a(i, j) = a(i, j) * factor * rest;
+    DivideByPower<E>(a, exponent);
     return exponent;
 }
 

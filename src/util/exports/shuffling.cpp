@@ -8,43 +8,58 @@
 namespace qx {
 namespace {
 
-// Shuffles the numbers 0 to n - 1, and whatever `exchange` exchanges along with them.
-template <class Exchange>
-Outcome Riffle(Out<I32_1D> &indices, int32_t n, int32_t seed, RandomState *state, bool isUnbiased,
-               const Exchange &exchange) {
-    if (n < 1)
-        return ErrEmptyInput;
+// Exchanges two elements of an array.
+template <class Array>
+struct ExchangeOf {
+    typename HandleTraits<Array>::T *elements;
+    void operator()(int32_t i, int32_t j) const {
+        const auto held = elements[i];
+        elements[i] = elements[j];
+        elements[j] = held;
+    }
+};
+struct NoExchange {
+    void operator()(int32_t, int32_t) const {}
+};
+
+// Makes `indices` the numbers 0 to n - 1 and lets `shuffle` exchange pairs of them, and whatever
+// `exchange` exchanges along with them.
+template <class Exchange, class ShuffleBy>
+Outcome ShuffleNumbers(Out<I32_1D> &indices, int32_t n, const Exchange &exchange,
+                       const ShuffleBy &shuffle) {
     if (const Outcome bad = indices.resize(n))
         return bad;
-    I32 *order = indices.data();
     for (int32_t i = 0; i < n; ++i)
-        order[i] = i;
-    if (seed >= 0)
-        RandomSeed(seed, *state);
-    Shuffle(n, isUnbiased, *state, [&](int32_t i, int32_t j) {
-        const int32_t held = order[i];
-        order[i] = order[j];
-        order[j] = held;
+        indices.data()[i] = i;
+    const ExchangeOf<I32_1D> numbers = {indices.data()};
+    shuffle([&](int32_t i, int32_t j) {
+        numbers(i, j);
         exchange(i, j);
     });
     return 0;
 }
 
+template <class Exchange>
+Outcome Riffle(Out<I32_1D> &indices, int32_t n, int32_t seed, RandomState *state, bool isUnbiased,
+               const Exchange &exchange) {
+    if (n < 1)
+        return ErrEmptyInput;
+    return ShuffleNumbers(indices, n, exchange, [&](const auto &both) {
+        if (seed >= 0)
+            RandomSeed(seed, *state);
+        Shuffle(n, isUnbiased, *state, both);
+    });
+}
+
 template <class Array>
 Outcome RiffleArray(InOut<Array> x, Out<I32_1D> indices, int32_t seed, RandomState *state,
                     int32_t unbiased) {
-    // By its own type: a deduced one would forget that elements are unaligned.
-    typename HandleTraits<Array>::T *elements = x.data();
-    return Riffle(indices, x.size(), seed, state, unbiased != 0, [elements](int32_t i, int32_t j) {
-        const auto held = elements[i];
-        elements[i] = elements[j];
-        elements[j] = held;
-    });
+    return Riffle(indices, x.size(), seed, state, unbiased != 0, ExchangeOf<Array>{x.data()});
 }
 
 Outcome RiffleNumbers(Out<I32_1D> indices, int32_t count, int32_t seed, RandomState *state,
                       int32_t unbiased) {
-    return Riffle(indices, count, seed, state, unbiased != 0, [](int32_t, int32_t) {});
+    return Riffle(indices, count, seed, state, unbiased != 0, NoExchange());
 }
 
 // Where the orders of 2026 take their numbers: that of element i at the position and i.
@@ -61,33 +76,18 @@ Outcome CounterRiffle(Out<I32_1D> &indices, int32_t n, const Start &start,
         position >= 0.0 && position <= 0x1p53 - n && position == std::floor(position);
     if (const Outcome bad = FirstFailed({{n < 1, ErrEmptyInput}, {!hasPlace, ErrIndexOutOfRange}}))
         return bad;
-    if (const Outcome bad = indices.resize(n))
-        return bad;
-    I32 *order = indices.data();
-    for (int32_t i = 0; i < n; ++i)
-        order[i] = i;
     const NoisePlace place = {key, stream, static_cast<uint64_t>(position), NoiseKind::Order};
-    CounterShuffle(n, place, [&](int32_t i, int32_t j) {
-        const int32_t held = order[i];
-        order[i] = order[j];
-        order[j] = held;
-        exchange(i, j);
-    });
-    return 0;
+    return ShuffleNumbers(indices, n, exchange,
+                          [&](const auto &both) { CounterShuffle(n, place, both); });
 }
 
 template <class Array>
 Outcome CounterRiffleArray(InOut<Array> x, Out<I32_1D> indices, Start start) {
-    typename HandleTraits<Array>::T *elements = x.data();
-    return CounterRiffle(indices, x.size(), start, [elements](int32_t i, int32_t j) {
-        const auto held = elements[i];
-        elements[i] = elements[j];
-        elements[j] = held;
-    });
+    return CounterRiffle(indices, x.size(), start, ExchangeOf<Array>{x.data()});
 }
 
 Outcome CounterRiffleNumbers(Out<I32_1D> indices, int32_t count, Start start) {
-    return CounterRiffle(indices, count, start, [](int32_t, int32_t) {});
+    return CounterRiffle(indices, count, start, NoExchange());
 }
 
 } // namespace
