@@ -74,7 +74,7 @@ ErrorCode InterpolateByPolynomial(const Table &table, double xi, double *yi, dou
     Tableau tableau;
     if (const ErrorCode failed = tableau.start(table, 0.0))
         return failed;
-    const auto &[c, d, memory] = tableau;
+    const RealVector c = tableau.c, d = tableau.d;
     const ConstRealVector x = table.x;
     return WalkTableau(table, NearestPoint(table, xi), tableau, yi, dy, [&](int32_t i, int32_t m) {
         if (x[i + m] == x[i])
@@ -98,7 +98,7 @@ ErrorCode InterpolateByRational(const Table &table, double xi, double *yi, doubl
     Tableau tableau;
     if (const ErrorCode failed = tableau.start(table, 1e-10)) // against 0 / 0 in the tableau
         return failed;
-    const auto &[c, d, memory] = tableau;
+    const RealVector c = tableau.c, d = tableau.d;
     return WalkTableau(table, nearest, tableau, yi, dy, [&](int32_t i, int32_t m) {
         const double difference = c[i + 1] - d[i];
         const double t = (x[i] - xi) * d[i] / (x[i + m] - xi);
