@@ -9,10 +9,11 @@ namespace {
 
 typedef Lanes<nativeLanes> L;
 
-// A tile of c, some rows of two vectors, stays in registers through `depth` terms. The part of b
+// A tile of c, some rows of some vectors, stays in registers through `depth` terms. The part of b
 // that it meets is packed into panels as wide as the tile, padded with zeros at the right edge, the
 // part of a into slivers as high as the tile. A panel stays in the first cache, a block of slivers
 // in the second, a block of panels in the third.
+constexpr bool isWide = nativeLanes == 8; // with 32 registers in place of 16
 constexpr std::ptrdiff_t depth = 256;
 constexpr std::ptrdiff_t blockRows = 96;
 constexpr std::ptrdiff_t blockCols = 2048;
@@ -38,8 +39,9 @@ struct Real {
     typedef RealOperand Operand;
     typedef RealFactor Factor;
     static constexpr std::ptrdiff_t parts = 1;
-    static constexpr std::ptrdiff_t tileRows = 4;
-    static constexpr std::ptrdiff_t tileCols = 2 * nativeLanes;
+    static constexpr std::ptrdiff_t tileRows = isWide ? 8 : 4;
+    static constexpr std::ptrdiff_t vectors = isWide ? 3 : 2; // of a row of the tile
+    static constexpr std::ptrdiff_t tileCols = vectors * nativeLanes;
 
     static Sign signOf(Factor f) {
         return f.value == 1.0 ? Sign::plus : f.value == -1.0 ? Sign::minus : Sign::scaled;
@@ -48,12 +50,12 @@ struct Real {
     static void packSliver(const Operand &a, std::ptrdiff_t height, std::ptrdiff_t k, DBL *to) {
         std::ptrdiff_t r = 0;
         if (a.across == 1)
-            for (; r + 2 <= height; r += 2)
-                interleave(a.data + r * a.down, a.down, k, to + r, height);
+            for (; r + nativeLanes <= height; r += nativeLanes)
+                transpose(a.data + r * a.down, a.down, k, to + r, height);
         else if (a.down == 1)
-            for (; r + 2 <= height; r += 2)
+            for (; r + nativeLanes <= height; r += nativeLanes)
                 for (std::ptrdiff_t q = 0; q < k; ++q)
-                    Lanes<2>::load(a.data + r + q * a.across).store(to + q * height + r);
+                    L::load(a.data + r + q * a.across).store(to + q * height + r);
         for (; r < height; ++r)
             for (std::ptrdiff_t q = 0; q < k; ++q)
                 to[q * height + r] = a.data[r * a.down + q * a.across];
@@ -71,54 +73,53 @@ struct Real {
                 to[q * tileCols + j] = j < cols ? b.data[q * b.down + j * b.across] : 0.0;
     }
 
-    // The first k elements of two rows, by turns.
-    static void interleave(const DBL *x, std::ptrdiff_t down, std::ptrdiff_t k, DBL *to,
-                           std::ptrdiff_t height) {
+    // The first k elements of as many rows as a vector has lanes, column after column.
+    static void transpose(const DBL *x, std::ptrdiff_t down, std::ptrdiff_t k, DBL *to,
+                          std::ptrdiff_t height) {
         std::ptrdiff_t q = 0;
-        for (; q + 2 <= k; q += 2) {
-            const Lanes<2> upper = Lanes<2>::load(x + q), lower = Lanes<2>::load(x + down + q);
-            TurnsLow(upper, lower).store(to + q * height);
-            TurnsHigh(upper, lower).store(to + (q + 1) * height);
+        for (; q + nativeLanes <= k; q += nativeLanes) {
+            L block[nativeLanes];
+            for (int i = 0; i < nativeLanes; ++i)
+                block[i] = L::load(x + i * down + q);
+            Transpose(block);
+            for (int i = 0; i < nativeLanes; ++i)
+                block[i].store(to + (q + i) * height);
         }
-        for (; q < k; ++q) {
-            to[q * height] = x[q];
-            to[q * height + 1] = x[down + q];
-        }
+        for (; q < k; ++q)
+            L::gather(x + q, down).store(to + q * height);
     }
 
-    // The sums of one row of the tile.
+    // The sums of one row of the tile, or of its first vectors.
+    template <std::ptrdiff_t Vectors>
     struct Sums {
         QX_INLINE void load(const DBL *c) {
-            x = L::load(c);
-            y = L::load(c + nativeLanes);
+            for (std::ptrdiff_t v = 0; v < Vectors; ++v)
+                x[v] = L::load(c + v * nativeLanes);
         }
         QX_INLINE void store(DBL *c) const {
-            x.store(c);
-            y.store(c + nativeLanes);
+            for (std::ptrdiff_t v = 0; v < Vectors; ++v)
+                x[v].store(c + v * nativeLanes);
         }
         template <class How>
-        QX_INLINE void add(const DBL *a, Factor factor, L bx, L by) {
+        QX_INLINE void add(const DBL *a, Factor factor, const L *b) {
             const L value(How::sign == Sign::scaled ? factor.value * *a : *a);
-            if constexpr (How::sign == Sign::minus) {
-                x = x - value * bx;
-                y = y - value * by;
-            } else {
-                x = x + value * bx;
-                y = y + value * by;
-            }
+            for (std::ptrdiff_t v = 0; v < Vectors; ++v)
+                x[v] = How::sign == Sign::minus ? x[v] - value * b[v] : x[v] + value * b[v];
         }
-        L x, y;
+        L x[Vectors];
     };
 };
 
-// The panel has the real parts of a row, then the imaginary parts, and so have the sums.
+// The panel has the real parts of a vector's columns, then their imaginary parts, and so have the
+// sums.
 struct Complex {
     typedef CDB T;
     typedef ComplexOperand Operand;
     typedef ComplexFactor Factor;
     static constexpr std::ptrdiff_t parts = 2;
-    static constexpr std::ptrdiff_t tileRows = 4;
-    static constexpr std::ptrdiff_t tileCols = nativeLanes;
+    static constexpr std::ptrdiff_t tileRows = isWide ? 8 : 4;
+    static constexpr std::ptrdiff_t vectors = 2;
+    static constexpr std::ptrdiff_t tileCols = vectors / 2 * nativeLanes;
 
     static Sign signOf(Factor f) { return f.im != 0.0 ? Sign::scaled : Real::signOf({f.re}); }
     static void packSliver(const Operand &a, std::ptrdiff_t height, std::ptrdiff_t k, DBL *to) {
@@ -135,14 +136,30 @@ struct Complex {
         }
     }
     static void packPanel(const Operand &b, std::ptrdiff_t cols, std::ptrdiff_t k, DBL *to) {
-        const Lanes<2> sign(b.isConjugated ? -1.0 : 1.0), none(0.0);
-        for (std::ptrdiff_t j = 0; j < tileCols; j += 2)
+        const double sign = b.isConjugated ? -1.0 : 1.0;
+        for (std::ptrdiff_t j = 0; j < tileCols; j += nativeLanes)
             for (std::ptrdiff_t q = 0; q < k; ++q) {
-                const Lanes<2> left = j < cols ? at(b, q, j) : none;
-                const Lanes<2> right = j + 1 < cols ? at(b, q, j + 1) : none;
-                TurnsLow(left, right).store(to + q * 2 * tileCols + j);
-                (TurnsHigh(left, right) * sign).store(to + (q * 2 + 1) * tileCols + j);
+                DBL *const row = to + (q * tileCols + j) * 2;
+                if (b.across == 1 && j + nativeLanes <= cols) {
+                    const DBL *const x =
+                        reinterpret_cast<const DBL *>(b.data + q * b.down + j);
+                    const L first = L::load(x), second = L::load(x + nativeLanes);
+                    Evens(first, second).store(row);
+                    (Odds(first, second) * L(sign)).store(row + nativeLanes);
+                } else {
+                    packSome(b, q, j, cols, sign, row);
+                }
             }
+    }
+    // The columns from j on of one row, as many as a vector has lanes.
+    static void packSome(const Operand &b, std::ptrdiff_t q, std::ptrdiff_t j, std::ptrdiff_t cols,
+                         double sign, DBL *to) {
+        for (std::ptrdiff_t i = 0; i < nativeLanes; i += 2) {
+            const Lanes<2> left = j + i < cols ? at(b, q, j + i) : Lanes<2>(0.0);
+            const Lanes<2> right = j + i + 1 < cols ? at(b, q, j + i + 1) : Lanes<2>(0.0);
+            TurnsLow(left, right).store(to + i);
+            (TurnsHigh(left, right) * Lanes<2>(sign)).store(to + nativeLanes + i);
+        }
     }
 
     // Element (i, j) as two doubles.
@@ -150,30 +167,38 @@ struct Complex {
         return Lanes<2>::load(reinterpret_cast<const DBL *>(a.data + i * a.down + j * a.across));
     }
 
+    template <std::ptrdiff_t Vectors>
     struct Sums {
         QX_INLINE void load(const DBL *c) {
-            const L first = L::load(c), second = L::load(c + nativeLanes);
-            re = Evens(first, second);
-            im = Odds(first, second);
+            for (std::ptrdiff_t v = 0; v < Vectors; v += 2) {
+                const L first = L::load(c + v * nativeLanes);
+                const L second = L::load(c + (v + 1) * nativeLanes);
+                x[v] = Evens(first, second);
+                x[v + 1] = Odds(first, second);
+            }
         }
         QX_INLINE void store(DBL *c) const {
-            TurnsLow(re, im).store(c);
-            TurnsHigh(re, im).store(c + nativeLanes);
+            for (std::ptrdiff_t v = 0; v < Vectors; v += 2) {
+                TurnsLow(x[v], x[v + 1]).store(c + v * nativeLanes);
+                TurnsHigh(x[v], x[v + 1]).store(c + (v + 1) * nativeLanes);
+            }
         }
         template <class How>
-        QX_INLINE void add(const DBL *a, Factor factor, L bRe, L bIm) {
-            double x = a[0], y = How::isConjugated ? -a[1] : a[1];
+        QX_INLINE void add(const DBL *a, Factor factor, const L *b) {
+            double re = a[0], im = How::isConjugated ? -a[1] : a[1];
             if constexpr (How::sign == Sign::scaled) {
-                const double scaled = factor.re * x - factor.im * y;
-                y = factor.re * y + factor.im * x;
-                x = scaled;
+                const double scaled = factor.re * re - factor.im * im;
+                im = factor.re * im + factor.im * re;
+                re = scaled;
             }
-            const L vx(x), vy(y);
-            const L termRe = vx * bRe - vy * bIm, termIm = vx * bIm + vy * bRe;
-            re = How::sign == Sign::minus ? re - termRe : re + termRe;
-            im = How::sign == Sign::minus ? im - termIm : im + termIm;
+            const L vRe(re), vIm(im);
+            for (std::ptrdiff_t v = 0; v < Vectors; v += 2) {
+                const L termRe = vRe * b[v] - vIm * b[v + 1], termIm = vRe * b[v + 1] + vIm * b[v];
+                x[v] = How::sign == Sign::minus ? x[v] - termRe : x[v] + termRe;
+                x[v + 1] = How::sign == Sign::minus ? x[v + 1] - termIm : x[v + 1] + termIm;
+            }
         }
-        L re, im;
+        L x[Vectors];
     };
 };
 
@@ -183,46 +208,53 @@ struct Place {
     std::ptrdiff_t down, across;
 };
 
-template <class Field, class How, std::ptrdiff_t Rows>
+// The tile, or its first rows and vectors.
+template <class Field, class How, std::ptrdiff_t Rows, std::ptrdiff_t Vectors>
 QX_INLINE void AddToTile(std::ptrdiff_t k, typename Field::Factor factor, const Place &a,
                          const DBL *panel, DBL *c, std::ptrdiff_t cStride) {
-    typename Field::Sums sums[Rows];
+    typename Field::template Sums<Vectors> sums[Rows];
     for (std::ptrdiff_t r = 0; r < Rows; ++r)
         sums[r].load(c + r * cStride);
     const DBL *at = a.data;
     for (std::ptrdiff_t p = 0; p < k; ++p) {
-        const L first = L::load(panel), second = L::load(panel + nativeLanes);
+        L row[Vectors];
+        for (std::ptrdiff_t v = 0; v < Vectors; ++v)
+            row[v] = L::load(panel + v * nativeLanes);
         for (std::ptrdiff_t r = 0; r < Rows; ++r)
-            sums[r].template add<How>(at + r * a.down, factor, first, second);
-        panel += 2 * nativeLanes;
+            sums[r].template add<How>(at + r * a.down, factor, row);
+        panel += Field::vectors * nativeLanes;
         at += a.across;
     }
     for (std::ptrdiff_t r = 0; r < Rows; ++r)
         sums[r].store(c + r * cStride);
 }
 
-// At the right edge a full tile is computed aside.
-template <class Field, class How, std::ptrdiff_t Rows>
+// At the right edge whole vectors are computed aside.
+template <class Field, class How, std::ptrdiff_t Rows, std::ptrdiff_t Vectors>
 void AddToEdge(std::ptrdiff_t k, typename Field::Factor factor, const Place &a, const DBL *panel,
                DBL *c, std::ptrdiff_t cStride, std::ptrdiff_t width) {
-    DBL aside[Rows * 2 * nativeLanes] = {};
+    constexpr std::ptrdiff_t whole = Vectors * nativeLanes;
+    DBL aside[Rows * whole] = {};
     for (std::ptrdiff_t r = 0; r < Rows; ++r)
         for (std::ptrdiff_t j = 0; j < width; ++j)
-            aside[r * 2 * nativeLanes + j] = c[r * cStride + j];
-    AddToTile<Field, How, Rows>(k, factor, a, panel, aside, 2 * nativeLanes);
+            aside[r * whole + j] = c[r * cStride + j];
+    AddToTile<Field, How, Rows, Vectors>(k, factor, a, panel, aside, whole);
     for (std::ptrdiff_t r = 0; r < Rows; ++r)
         for (std::ptrdiff_t j = 0; j < width; ++j)
-            c[r * cStride + j] = aside[r * 2 * nativeLanes + j];
+            c[r * cStride + j] = aside[r * whole + j];
 }
 
-// `width` doubles of each of the rows.
-template <class Field, class How, std::ptrdiff_t Rows>
+// `width` doubles of each of the rows, in no more vectors than they take.
+template <class Field, class How, std::ptrdiff_t Rows, std::ptrdiff_t Vectors = Field::vectors>
 QX_INLINE void AddToRows(std::ptrdiff_t k, typename Field::Factor factor, const Place &a,
                          const DBL *panel, DBL *c, std::ptrdiff_t cStride, std::ptrdiff_t width) {
-    if (width == 2 * nativeLanes)
-        AddToTile<Field, How, Rows>(k, factor, a, panel, c, cStride);
-    else
-        AddToEdge<Field, How, Rows>(k, factor, a, panel, c, cStride, width);
+    if (width == Vectors * nativeLanes)
+        return AddToTile<Field, How, Rows, Vectors>(k, factor, a, panel, c, cStride);
+    if constexpr (isWide && Vectors > Field::parts)
+        if (width <= (Vectors - Field::parts) * nativeLanes)
+            return AddToRows<Field, How, Rows, Vectors - Field::parts>(k, factor, a, panel, c,
+                                                                       cStride, width);
+    AddToEdge<Field, How, Rows, Vectors>(k, factor, a, panel, c, cStride, width);
 }
 
 // An operand without its first rows and columns.
@@ -237,7 +269,7 @@ void AddSmall(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, typename Fie
               const typename Field::Operand &a, const typename Field::Operand &b, DBL *c,
               std::ptrdiff_t cStride) {
     constexpr std::ptrdiff_t parts = Field::parts;
-    DBL panel[smallDepth * 2 * nativeLanes];
+    DBL panel[smallDepth * Field::vectors * nativeLanes];
     for (std::ptrdiff_t p = 0; p < k; p += smallDepth) {
         const std::ptrdiff_t terms = k - p < smallDepth ? k - p : smallDepth;
         for (std::ptrdiff_t top = 0; top < m; top += smallBand) {
@@ -278,14 +310,21 @@ void AddSmallAs(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, Sign sign,
         AddSmall<Field, Taken<Sign::scaled, Conjugated>>(m, n, k, factor, a, b, c, cStride);
 }
 
+// The height of the next sliver: that of a tile, or at the lower edge half of it, or what is left.
+template <class Field>
+std::ptrdiff_t SliverHeight(std::ptrdiff_t rows) {
+    return rows >= Field::tileRows ? Field::tileRows : rows >= 4 ? 4 : rows;
+}
+
 // The slivers of the first rows and terms of a, each with one term after the other.
 template <class Field>
 void PackSlivers(const typename Field::Operand &a, std::ptrdiff_t rows, std::ptrdiff_t k, Sign sign,
                  typename Field::Factor factor, DBL *to) {
     const std::ptrdiff_t count = rows * k * Field::parts;
     DBL *sliver = to;
-    for (std::ptrdiff_t i = 0; i < rows; i += Field::tileRows) {
-        const std::ptrdiff_t height = rows - i < Field::tileRows ? rows - i : Field::tileRows;
+    std::ptrdiff_t height = 0;
+    for (std::ptrdiff_t i = 0; i < rows; i += height) {
+        height = SliverHeight<Field>(rows - i);
         Field::packSliver(From(a, i, 0), height, k, sliver);
         sliver += height * k * Field::parts;
     }
@@ -306,19 +345,28 @@ void AddPanel(std::ptrdiff_t rows, std::ptrdiff_t k, const DBL *slivers, const D
         AddToRows<Field, Packed, Rows>(terms, {}, {sliver, parts, Rows * parts}, b, to, stride,
                                        doubles);
     };
-    std::ptrdiff_t i = 0;
-    for (; i + tileRows <= rows; i += tileRows)
-        add.template operator()<tileRows>(k, slivers + i * k * parts, panel, c + i * cStride,
-                                          cStride, width);
-    slivers += i * k * parts;
-    c += i * cStride;
-    switch (rows - i) {
-    case 1:
-        return add.template operator()<1>(k, slivers, panel, c, cStride, width);
-    case 2:
-        return add.template operator()<2>(k, slivers, panel, c, cStride, width);
-    case 3:
-        return add.template operator()<3>(k, slivers, panel, c, cStride, width);
+    while (rows > 0) {
+        const std::ptrdiff_t height = SliverHeight<Field>(rows);
+        switch (height) {
+        case tileRows:
+            add.template operator()<tileRows>(k, slivers, panel, c, cStride, width);
+            break;
+        case 1:
+            add.template operator()<1>(k, slivers, panel, c, cStride, width);
+            break;
+        case 2:
+            add.template operator()<2>(k, slivers, panel, c, cStride, width);
+            break;
+        case 3:
+            add.template operator()<3>(k, slivers, panel, c, cStride, width);
+            break;
+        case tileRows == 4 ? 0 : 4:
+            add.template operator()<4>(k, slivers, panel, c, cStride, width);
+            break;
+        }
+        rows -= height;
+        slivers += height * k * parts;
+        c += height * cStride;
     }
 }
 
@@ -334,7 +382,7 @@ void AddLarge(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, Sign sign,
         const std::ptrdiff_t right = n - left < cols ? n : left + cols;
         for (std::ptrdiff_t p = 0; p < k; p += depth) {
             const std::ptrdiff_t terms = k - p < depth ? k - p : depth;
-            const std::ptrdiff_t panelSize = terms * 2 * nativeLanes;
+            const std::ptrdiff_t panelSize = terms * Field::vectors * nativeLanes;
             DBL *panel = panels;
             for (std::ptrdiff_t j = left; j < right; j += tileCols, panel += panelSize)
                 Field::packPanel(From(b, p, j), right - j < tileCols ? right - j : tileCols, terms,

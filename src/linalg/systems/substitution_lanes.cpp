@@ -50,12 +50,10 @@ struct RealRow {
     }
     static double conjugate(const T &a) { return a; }
     static void gather(const T *x, DBL *row) {
-        for (std::ptrdiff_t j = 0; j < columns; ++j)
-            row[j] = x[j];
+        load(x).store(row);
     }
     static void scatter(const DBL *row, T *x) {
-        for (std::ptrdiff_t j = 0; j < columns; ++j)
-            x[j] = row[j];
+        load(row).store(x);
     }
 };
 
@@ -249,11 +247,11 @@ void SolveAll(Factors factors, const T *a, std::ptrdiff_t n, std::ptrdiff_t righ
 
 void SubstituteStrips(Factors factors, const DBL *a, std::ptrdiff_t n, std::ptrdiff_t rightSides,
                       DBL *x, DBL *strip) {
-    SolveAll<RealRow, 8>(factors, a, n, rightSides, x, strip);
+    SolveAll<RealRow, nativeLanes == 8 ? 4 : 8>(factors, a, n, rightSides, x, strip);
 }
 void CxSubstituteStrips(Factors factors, const CDB *a, std::ptrdiff_t n, std::ptrdiff_t rightSides,
                         CDB *x, DBL *strip) {
-    SolveAll<ComplexRow, 4>(factors, a, n, rightSides, x, strip);
+    SolveAll<ComplexRow, nativeLanes == 8 ? 2 : 4>(factors, a, n, rightSides, x, strip);
 }
 
 } // namespace qx::QX_WIDTH
