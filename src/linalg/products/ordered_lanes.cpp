@@ -102,9 +102,12 @@ struct Real {
         }
         template <class How>
         QX_INLINE void add(const DBL *a, Factor factor, const L *b) {
-            const L value(How::sign == Sign::scaled ? factor.value * *a : *a);
-            for (std::ptrdiff_t v = 0; v < Vectors; ++v)
-                x[v] = How::sign == Sign::minus ? x[v] - value * b[v] : x[v] + value * b[v];
+            const DBL value = How::sign == Sign::scaled ? factor.value * *a : *a;
+            const DBL *const at = How::sign == Sign::scaled ? &value : a;
+            for (std::ptrdiff_t v = 0; v < Vectors; ++v) {
+                const L term = Times(b[v], at);
+                x[v] = How::sign == Sign::minus ? x[v] - term : x[v] + term;
+            }
         }
         L x[Vectors];
     };
@@ -185,15 +188,17 @@ struct Complex {
         }
         template <class How>
         QX_INLINE void add(const DBL *a, Factor factor, const L *b) {
-            double re = a[0], im = How::isConjugated ? -a[1] : a[1];
+            DBL at[2] = {a[0], How::isConjugated ? -a[1] : a[1]};
             if constexpr (How::sign == Sign::scaled) {
-                const double scaled = factor.re * re - factor.im * im;
-                im = factor.re * im + factor.im * re;
-                re = scaled;
+                const double re = at[0], im = at[1];
+                at[0] = factor.re * re - factor.im * im;
+                at[1] = factor.re * im + factor.im * re;
             }
-            const L vRe(re), vIm(im);
+            const bool asItIs = How::sign != Sign::scaled && !How::isConjugated;
+            const DBL *const re = asItIs ? a : at, *const im = re + 1;
             for (std::ptrdiff_t v = 0; v < Vectors; v += 2) {
-                const L termRe = vRe * b[v] - vIm * b[v + 1], termIm = vRe * b[v + 1] + vIm * b[v];
+                const L termRe = Times(b[v], re) - Times(b[v + 1], im);
+                const L termIm = Times(b[v + 1], re) + Times(b[v], im);
                 x[v] = How::sign == Sign::minus ? x[v] - termRe : x[v] + termRe;
                 x[v + 1] = How::sign == Sign::minus ? x[v + 1] - termIm : x[v + 1] + termIm;
             }
