@@ -10,6 +10,14 @@
 // Operations become part of the loop that uses them, at every level of optimisation.
 #define QX_INLINE __attribute__((always_inline)) inline
 
+// Before a loop of at most eight rounds over an array of vectors, which then stays in registers: by
+// itself g++ 12 unrolls some of them too late for that.
+#ifdef __clang__
+#define QX_UNROLLED _Pragma("unroll")
+#else
+#define QX_UNROLLED _Pragma("GCC unroll 8")
+#endif
+
 namespace qx {
 
 // SIMD over independent elements: Lanes<N> holds N doubles, and every operation does in each lane
@@ -92,6 +100,29 @@ public:
     }
     QX_INLINE void store(DBL *x) const {
         *reinterpret_cast<typename LaneVector<N>::inMemory *>(x) = v;
+    }
+
+    // The first `count` elements, with zeros in the lanes behind; and these alone back to memory.
+    static QX_INLINE Lanes loadFirst(const DBL *x, std::ptrdiff_t count) {
+#ifdef __AVX512F__
+        if constexpr (N == 8)
+            return Lanes(
+                __builtin_ia32_loadupd512_mask(reinterpret_cast<const double *>(x), Vector{},
+                                               static_cast<unsigned char>((1U << count) - 1)));
+#endif
+        Vector first = {};
+        for (std::ptrdiff_t i = 0; i < count; ++i)
+            first[i] = x[i];
+        return Lanes(first);
+    }
+    QX_INLINE void storeFirst(DBL *x, std::ptrdiff_t count) const {
+#ifdef __AVX512F__
+        if constexpr (N == 8)
+            return __builtin_ia32_storeupd512_mask(reinterpret_cast<double *>(x), v,
+                                                   static_cast<unsigned char>((1U << count) - 1));
+#endif
+        for (std::ptrdiff_t i = 0; i < count; ++i)
+            x[i] = v[i];
     }
 
     // Elements 0, stride, 2 stride, ...
@@ -301,8 +332,7 @@ QX_INLINE Lanes<4> MinusPlus(Lanes<4> a, Lanes<4> b) {
     return Lanes<4>(__builtin_shufflevector((a - b).v, (a + b).v, 0, 5, 2, 7));
 }
 QX_INLINE Lanes<8> MinusPlus(Lanes<8> a, Lanes<8> b) {
-    return Lanes<8>(
-        __builtin_shufflevector((a - b).v, (a + b).v, 0, 9, 2, 11, 4, 13, 6, 15));
+    return Lanes<8>(__builtin_shufflevector((a - b).v, (a + b).v, 0, 9, 2, 11, 4, 13, 6, 15));
 }
 
 // Pairs from N / 2 places, and back.
@@ -314,9 +344,8 @@ QX_INLINE Lanes<N> LoadPairs(const DBL *const *from, std::ptrdiff_t at) {
     else if constexpr (N == 4)
         return Lanes<N>(__builtin_shufflevector(a.v, Lanes<2>::load(from[1] + at).v, 0, 1, 2, 3));
     else
-        return Lanes<N>(__builtin_shufflevector(LoadPairs<4>(from, at).v,
-                                                LoadPairs<4>(from + 2, at).v, 0, 1, 2, 3, 4, 5, 6,
-                                                7));
+        return Lanes<N>(__builtin_shufflevector(
+            LoadPairs<4>(from, at).v, LoadPairs<4>(from + 2, at).v, 0, 1, 2, 3, 4, 5, 6, 7));
 }
 QX_INLINE void StorePairs(Lanes<2> pairs, DBL *const *to, std::ptrdiff_t at) {
     pairs.store(to[0] + at);

@@ -14,13 +14,15 @@ typedef Lanes<nativeLanes> L;
 // part of a into slivers as high as the tile. A panel stays in the first cache, a block of slivers
 // in the second, a block of panels in the third.
 constexpr bool isWide = nativeLanes == 8; // with 32 registers in place of 16
-constexpr std::ptrdiff_t depth = 256;
-constexpr std::ptrdiff_t blockRows = 96;
+constexpr std::ptrdiff_t depth = isWide ? 192 : 256;
+constexpr std::ptrdiff_t blockRows = isWide ? 128 : 96;
 constexpr std::ptrdiff_t blockCols = 2048;
 // Of small products only the panels are packed, on the stack.
 constexpr std::ptrdiff_t smallDepth = 64;
 constexpr std::ptrdiff_t smallBand = 128;
-constexpr std::ptrdiff_t smallProduct = 40 * 40 * 40;
+constexpr std::ptrdiff_t smallProduct = isWide ? 24 * 24 * 24 : 40 * 40 * 40;
+// Up to that size operands may stay where they are.
+constexpr std::ptrdiff_t mostInPlace = 160 * 160;
 
 // What happens to an element of a on its way: none of it where it has been packed.
 enum class Sign { plus, minus, scaled };
@@ -89,21 +91,46 @@ struct Real {
             L::gather(x + q, down).store(to + q * height);
     }
 
+    // A row of b, of which nothing behind `width` elements is read.
+    template <std::ptrdiff_t Vectors>
+    static QX_INLINE void loadRow(const DBL *b, std::ptrdiff_t width, L *row) {
+        constexpr std::ptrdiff_t whole = (Vectors - 1) * nativeLanes;
+        QX_UNROLLED
+        for (std::ptrdiff_t v = 0; v < Vectors - 1; ++v)
+            row[v] = L::load(b + v * nativeLanes);
+        row[Vectors - 1] = L::loadFirst(b + whole, width - whole);
+    }
+
     // The sums of one row of the tile, or of its first vectors.
     template <std::ptrdiff_t Vectors>
     struct Sums {
+        static constexpr std::ptrdiff_t count = Vectors;
         QX_INLINE void load(const DBL *c) {
+            QX_UNROLLED
             for (std::ptrdiff_t v = 0; v < Vectors; ++v)
                 x[v] = L::load(c + v * nativeLanes);
         }
         QX_INLINE void store(DBL *c) const {
+            QX_UNROLLED
             for (std::ptrdiff_t v = 0; v < Vectors; ++v)
                 x[v].store(c + v * nativeLanes);
+        }
+        // The last vector in part.
+        QX_INLINE void loadPart(const DBL *c, std::ptrdiff_t width) {
+            loadRow<Vectors>(c, width, x);
+        }
+        QX_INLINE void storePart(DBL *c, std::ptrdiff_t width) const {
+            constexpr std::ptrdiff_t whole = (Vectors - 1) * nativeLanes;
+            QX_UNROLLED
+            for (std::ptrdiff_t v = 0; v < Vectors - 1; ++v)
+                x[v].store(c + v * nativeLanes);
+            x[Vectors - 1].storeFirst(c + whole, width - whole);
         }
         template <class How>
         QX_INLINE void add(const DBL *a, Factor factor, const L *b) {
             const DBL value = How::sign == Sign::scaled ? factor.value * *a : *a;
             const DBL *const at = How::sign == Sign::scaled ? &value : a;
+            QX_UNROLLED
             for (std::ptrdiff_t v = 0; v < Vectors; ++v) {
                 const L term = Times(b[v], at);
                 x[v] = How::sign == Sign::minus ? x[v] - term : x[v] + term;
@@ -144,8 +171,7 @@ struct Complex {
             for (std::ptrdiff_t q = 0; q < k; ++q) {
                 DBL *const row = to + (q * tileCols + j) * 2;
                 if (b.across == 1 && j + nativeLanes <= cols) {
-                    const DBL *const x =
-                        reinterpret_cast<const DBL *>(b.data + q * b.down + j);
+                    const DBL *const x = reinterpret_cast<const DBL *>(b.data + q * b.down + j);
                     const L first = L::load(x), second = L::load(x + nativeLanes);
                     Evens(first, second).store(row);
                     (Odds(first, second) * L(sign)).store(row + nativeLanes);
@@ -165,6 +191,14 @@ struct Complex {
         }
     }
 
+    // A row of the panel, which is padded.
+    template <std::ptrdiff_t Vectors>
+    static QX_INLINE void loadRow(const DBL *panel, std::ptrdiff_t, L *row) {
+        QX_UNROLLED
+        for (std::ptrdiff_t v = 0; v < Vectors; ++v)
+            row[v] = L::load(panel + v * nativeLanes);
+    }
+
     // Element (i, j) as two doubles.
     static QX_INLINE Lanes<2> at(const Operand &a, std::ptrdiff_t i, std::ptrdiff_t j) {
         return Lanes<2>::load(reinterpret_cast<const DBL *>(a.data + i * a.down + j * a.across));
@@ -172,7 +206,9 @@ struct Complex {
 
     template <std::ptrdiff_t Vectors>
     struct Sums {
+        static constexpr std::ptrdiff_t count = Vectors;
         QX_INLINE void load(const DBL *c) {
+            QX_UNROLLED
             for (std::ptrdiff_t v = 0; v < Vectors; v += 2) {
                 const L first = L::load(c + v * nativeLanes);
                 const L second = L::load(c + (v + 1) * nativeLanes);
@@ -181,10 +217,25 @@ struct Complex {
             }
         }
         QX_INLINE void store(DBL *c) const {
+            QX_UNROLLED
             for (std::ptrdiff_t v = 0; v < Vectors; v += 2) {
                 TurnsLow(x[v], x[v + 1]).store(c + v * nativeLanes);
                 TurnsHigh(x[v], x[v + 1]).store(c + (v + 1) * nativeLanes);
             }
+        }
+        // The only pair of vectors in part.
+        QX_INLINE void loadPart(const DBL *c, std::ptrdiff_t width) {
+            static_assert(Vectors == 2);
+            const std::ptrdiff_t whole = width < nativeLanes ? width : nativeLanes;
+            const L first = L::loadFirst(c, whole);
+            const L second = L::loadFirst(c + whole, width - whole);
+            x[0] = Evens(first, second);
+            x[1] = Odds(first, second);
+        }
+        QX_INLINE void storePart(DBL *c, std::ptrdiff_t width) const {
+            const std::ptrdiff_t whole = width < nativeLanes ? width : nativeLanes;
+            TurnsLow(x[0], x[1]).storeFirst(c, whole);
+            TurnsHigh(x[0], x[1]).storeFirst(c + whole, width - whole);
         }
         template <class How>
         QX_INLINE void add(const DBL *a, Factor factor, const L *b) {
@@ -196,6 +247,7 @@ struct Complex {
             }
             const bool asItIs = How::sign != Sign::scaled && !How::isConjugated;
             const DBL *const re = asItIs ? a : at, *const im = re + 1;
+            QX_UNROLLED
             for (std::ptrdiff_t v = 0; v < Vectors; v += 2) {
                 const L termRe = Times(b[v], re) - Times(b[v + 1], im);
                 const L termIm = Times(b[v + 1], re) + Times(b[v], im);
@@ -213,53 +265,90 @@ struct Place {
     std::ptrdiff_t down, across;
 };
 
-// The tile, or its first rows and vectors.
-template <class Field, class How, std::ptrdiff_t Rows, std::ptrdiff_t Vectors>
+// Where a tile finds its elements of b: in a panel, or in b itself.
+struct PanelPlace {
+    const DBL *data;
+    std::ptrdiff_t down;
+};
+
+template <class Field, class How, std::ptrdiff_t Rows>
 QX_INLINE void AddToTile(std::ptrdiff_t k, typename Field::Factor factor, const Place &a,
-                         const DBL *panel, DBL *c, std::ptrdiff_t cStride) {
-    typename Field::template Sums<Vectors> sums[Rows];
+                         const PanelPlace &b, DBL *c, std::ptrdiff_t cStride) {
+    typename Field::template Sums<Field::vectors> sums[Rows];
+    QX_UNROLLED
     for (std::ptrdiff_t r = 0; r < Rows; ++r)
         sums[r].load(c + r * cStride);
-    const DBL *at = a.data;
+    const DBL *at = a.data, *panel = b.data;
     for (std::ptrdiff_t p = 0; p < k; ++p) {
-        L row[Vectors];
-        for (std::ptrdiff_t v = 0; v < Vectors; ++v)
+        L row[Field::vectors];
+        QX_UNROLLED
+        for (std::ptrdiff_t v = 0; v < Field::vectors; ++v)
             row[v] = L::load(panel + v * nativeLanes);
+        QX_UNROLLED
         for (std::ptrdiff_t r = 0; r < Rows; ++r)
             sums[r].template add<How>(at + r * a.down, factor, row);
-        panel += Field::vectors * nativeLanes;
+        panel += b.down;
         at += a.across;
     }
+    QX_UNROLLED
     for (std::ptrdiff_t r = 0; r < Rows; ++r)
         sums[r].store(c + r * cStride);
 }
 
-// At the right edge whole vectors are computed aside.
-template <class Field, class How, std::ptrdiff_t Rows, std::ptrdiff_t Vectors>
-void AddToEdge(std::ptrdiff_t k, typename Field::Factor factor, const Place &a, const DBL *panel,
+// At the right edge: `width` doubles of each of the rows, in no more vectors than they take.
+template <class Field, class How, std::ptrdiff_t Rows, std::ptrdiff_t Vectors = Field::vectors>
+void AddToEdge(std::ptrdiff_t k, typename Field::Factor factor, const Place &a, const PanelPlace &b,
                DBL *c, std::ptrdiff_t cStride, std::ptrdiff_t width) {
-    constexpr std::ptrdiff_t whole = Vectors * nativeLanes;
+    constexpr std::ptrdiff_t parts = Field::parts;
+    if constexpr (Vectors > parts)
+        if (width <= (Vectors - parts) * nativeLanes)
+            return AddToEdge<Field, How, Rows, Vectors - parts>(k, factor, a, b, c, cStride, width);
+    typename Field::template Sums<Vectors> sums[Rows];
+    QX_UNROLLED
+    for (std::ptrdiff_t r = 0; r < Rows; ++r)
+        sums[r].loadPart(c + r * cStride, width);
+    const DBL *at = a.data, *panel = b.data;
+    for (std::ptrdiff_t p = 0; p < k; ++p) {
+        L row[Vectors];
+        Field::template loadRow<Vectors>(panel, width, row);
+        QX_UNROLLED
+        for (std::ptrdiff_t r = 0; r < Rows; ++r)
+            sums[r].template add<How>(at + r * a.down, factor, row);
+        panel += b.down;
+        at += a.across;
+    }
+    QX_UNROLLED
+    for (std::ptrdiff_t r = 0; r < Rows; ++r)
+        sums[r].storePart(c + r * cStride, width);
+}
+// Without registers that are loaded in part, a full tile is computed aside.
+template <class Field, class How, std::ptrdiff_t Rows>
+void AddAside(std::ptrdiff_t k, typename Field::Factor factor, const Place &a, const PanelPlace &b,
+              DBL *c, std::ptrdiff_t cStride, std::ptrdiff_t width) {
+    constexpr std::ptrdiff_t whole = Field::vectors * nativeLanes;
     DBL aside[Rows * whole] = {};
+    QX_UNROLLED
     for (std::ptrdiff_t r = 0; r < Rows; ++r)
         for (std::ptrdiff_t j = 0; j < width; ++j)
             aside[r * whole + j] = c[r * cStride + j];
-    AddToTile<Field, How, Rows, Vectors>(k, factor, a, panel, aside, whole);
+    AddToTile<Field, How, Rows>(k, factor, a, b, aside, whole);
+    QX_UNROLLED
     for (std::ptrdiff_t r = 0; r < Rows; ++r)
         for (std::ptrdiff_t j = 0; j < width; ++j)
             c[r * cStride + j] = aside[r * whole + j];
 }
 
-// `width` doubles of each of the rows, in no more vectors than they take.
-template <class Field, class How, std::ptrdiff_t Rows, std::ptrdiff_t Vectors = Field::vectors>
+// `width` doubles of each of the rows.
+template <class Field, class How, std::ptrdiff_t Rows>
 QX_INLINE void AddToRows(std::ptrdiff_t k, typename Field::Factor factor, const Place &a,
-                         const DBL *panel, DBL *c, std::ptrdiff_t cStride, std::ptrdiff_t width) {
-    if (width == Vectors * nativeLanes)
-        return AddToTile<Field, How, Rows, Vectors>(k, factor, a, panel, c, cStride);
-    if constexpr (isWide && Vectors > Field::parts)
-        if (width <= (Vectors - Field::parts) * nativeLanes)
-            return AddToRows<Field, How, Rows, Vectors - Field::parts>(k, factor, a, panel, c,
-                                                                       cStride, width);
-    AddToEdge<Field, How, Rows, Vectors>(k, factor, a, panel, c, cStride, width);
+                         const PanelPlace &b, DBL *c, std::ptrdiff_t cStride,
+                         std::ptrdiff_t width) {
+    if (width == Field::vectors * nativeLanes)
+        AddToTile<Field, How, Rows>(k, factor, a, b, c, cStride);
+    else if constexpr (isWide)
+        AddToEdge<Field, How, Rows>(k, factor, a, b, c, cStride, width);
+    else
+        AddAside<Field, How, Rows>(k, factor, a, b, c, cStride, width);
 }
 
 // An operand without its first rows and columns.
@@ -275,6 +364,7 @@ void AddSmall(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, typename Fie
               std::ptrdiff_t cStride) {
     constexpr std::ptrdiff_t parts = Field::parts;
     DBL panel[smallDepth * Field::vectors * nativeLanes];
+    const PanelPlace packed = {panel, Field::vectors * nativeLanes};
     for (std::ptrdiff_t p = 0; p < k; p += smallDepth) {
         const std::ptrdiff_t terms = k - p < smallDepth ? k - p : smallDepth;
         for (std::ptrdiff_t top = 0; top < m; top += smallBand) {
@@ -287,13 +377,13 @@ void AddSmall(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, typename Fie
                                a.down * parts, a.across * parts};
                 DBL *row = c + i * cStride + j * parts;
                 for (; i + Field::tileRows <= bottom; i += Field::tileRows) {
-                    AddToRows<Field, How, Field::tileRows>(terms, factor, place, panel, row,
+                    AddToRows<Field, How, Field::tileRows>(terms, factor, place, packed, row,
                                                            cStride, cols * parts);
                     place.data += Field::tileRows * place.down;
                     row += Field::tileRows * cStride;
                 }
                 for (; i < bottom; ++i) {
-                    AddToRows<Field, How, 1>(terms, factor, place, panel, row, cStride,
+                    AddToRows<Field, How, 1>(terms, factor, place, packed, row, cStride,
                                              cols * parts);
                     place.data += place.down;
                     row += cStride;
@@ -304,9 +394,12 @@ void AddSmall(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, typename Fie
 }
 
 template <class Field, bool Conjugated>
-void AddSmallAs(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, Sign sign,
-                typename Field::Factor factor, const typename Field::Operand &a,
-                const typename Field::Operand &b, DBL *c, std::ptrdiff_t cStride) {
+void AddSmallAs(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, typename Field::Factor factor,
+                const typename Field::Operand &a, const typename Field::Operand &b,
+                typename Field::T *result, std::ptrdiff_t cStride) {
+    const Sign sign = Field::signOf(factor);
+    DBL *const c = reinterpret_cast<DBL *>(result);
+    cStride *= Field::parts;
     if (sign == Sign::plus)
         AddSmall<Field, Taken<Sign::plus, Conjugated>>(m, n, k, factor, a, b, c, cStride);
     else if (sign == Sign::minus)
@@ -339,40 +432,36 @@ void PackSlivers(const typename Field::Operand &a, std::ptrdiff_t rows, std::ptr
         Field::scale(to, count, factor);
 }
 
+// Calls add<height>(first row) for each sliver.
+template <class Field, class Add>
+QX_INLINE void ForEachSliver(std::ptrdiff_t rows, const Add &add) {
+    constexpr std::ptrdiff_t tileRows = Field::tileRows;
+    std::ptrdiff_t i = 0;
+    for (; i + tileRows <= rows; i += tileRows)
+        add.template operator()<tileRows>(i);
+    if (tileRows > 4 && rows - i >= 4) {
+        add.template operator()<4>(i);
+        i += 4;
+    }
+    switch (rows - i) {
+    case 1:
+        return add.template operator()<1>(i);
+    case 2:
+        return add.template operator()<2>(i);
+    case 3:
+        return add.template operator()<3>(i);
+    }
+}
+
 // All rows of a block of slivers with one panel.
 template <class Field>
-void AddPanel(std::ptrdiff_t rows, std::ptrdiff_t k, const DBL *slivers, const DBL *panel, DBL *c,
-              std::ptrdiff_t cStride, std::ptrdiff_t width) {
-    constexpr std::ptrdiff_t tileRows = Field::tileRows, parts = Field::parts;
-    constexpr auto add = []<std::ptrdiff_t Rows>(std::ptrdiff_t terms, const DBL *sliver,
-                                                 const DBL *b, DBL *to, std::ptrdiff_t stride,
-                                                 std::ptrdiff_t doubles) {
-        AddToRows<Field, Packed, Rows>(terms, {}, {sliver, parts, Rows * parts}, b, to, stride,
-                                       doubles);
-    };
-    while (rows > 0) {
-        const std::ptrdiff_t height = SliverHeight<Field>(rows);
-        switch (height) {
-        case tileRows:
-            add.template operator()<tileRows>(k, slivers, panel, c, cStride, width);
-            break;
-        case 1:
-            add.template operator()<1>(k, slivers, panel, c, cStride, width);
-            break;
-        case 2:
-            add.template operator()<2>(k, slivers, panel, c, cStride, width);
-            break;
-        case 3:
-            add.template operator()<3>(k, slivers, panel, c, cStride, width);
-            break;
-        case tileRows == 4 ? 0 : 4:
-            add.template operator()<4>(k, slivers, panel, c, cStride, width);
-            break;
-        }
-        rows -= height;
-        slivers += height * k * parts;
-        c += height * cStride;
-    }
+void AddPanel(std::ptrdiff_t rows, std::ptrdiff_t k, const DBL *slivers, const PanelPlace &b,
+              DBL *c, std::ptrdiff_t cStride, std::ptrdiff_t width) {
+    constexpr std::ptrdiff_t parts = Field::parts;
+    ForEachSliver<Field>(rows, [&]<std::ptrdiff_t Rows>(std::ptrdiff_t i) {
+        AddToRows<Field, Packed, Rows>(k, {}, {slivers + i * k * parts, parts, Rows * parts}, b,
+                                       c + i * cStride, cStride, width);
+    });
 }
 
 template <class Field>
@@ -397,41 +486,84 @@ void AddLarge(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, Sign sign,
                 PackSlivers<Field>(From(a, i, p), rows, terms, sign, factor, slivers);
                 panel = panels;
                 for (std::ptrdiff_t j = left; j < right; j += tileCols, panel += panelSize)
-                    AddPanel<Field>(rows, terms, slivers, panel, c + i * cStride + j * Field::parts,
-                                    cStride,
+                    AddPanel<Field>(rows, terms, slivers, {panel, Field::vectors * nativeLanes},
+                                    c + i * cStride + j * Field::parts, cStride,
                                     (right - j < tileCols ? right - j : tileCols) * Field::parts);
             }
         }
     }
 }
 
-template <class Field>
-void Add(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, typename Field::Factor factor,
-         const typename Field::Operand &a, const typename Field::Operand &b,
-         typename Field::T *result, std::ptrdiff_t cStride) {
-    const Sign sign = Field::signOf(factor);
-    DBL *const c = reinterpret_cast<DBL *>(result);
-    cStride *= Field::parts;
-    if (m * n > smallProduct / (k + 1) && m > Field::tileRows && n > Field::tileCols) {
-        const PanelMemory memory;
-        if (memory.data() != nullptr)
-            return AddLarge<Field>(m, n, k, sign, factor, a, b, c, cStride, memory.data());
+// Without any copy: a real product whose operands fit in the second cache, b with its rows in one piece.
+template <class How>
+void AddInPlace(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, const RealOperand &a,
+                const RealOperand &b, DBL *c, std::ptrdiff_t cStride) {
+    for (std::ptrdiff_t j = 0; j < n; j += Real::tileCols) {
+        const std::ptrdiff_t width = n - j < Real::tileCols ? n - j : Real::tileCols;
+        ForEachSliver<Real>(m, [&]<std::ptrdiff_t Rows>(std::ptrdiff_t i) {
+            AddToRows<Real, How, Rows>(k, {}, {a.data + i * a.down, a.down, a.across},
+                                       {b.data + j, b.down}, c + i * cStride + j, cStride, width);
+        });
     }
-    if constexpr (Field::parts == 2)
-        if (a.isConjugated)
-            return AddSmallAs<Field, true>(m, n, k, sign, factor, a, b, c, cStride);
-    AddSmallAs<Field, false>(m, n, k, sign, factor, a, b, c, cStride);
+}
+bool AddIfInPlace(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, RealFactor factor,
+                  const RealOperand &a, const RealOperand &b, DBL *c, std::ptrdiff_t cStride) {
+    const Sign sign = Real::signOf(factor);
+    if (b.across != 1 || sign == Sign::scaled || m * k > mostInPlace || n * k > mostInPlace)
+        return false;
+    if (sign == Sign::plus)
+        AddInPlace<Taken<Sign::plus, false>>(m, n, k, a, b, c, cStride);
+    else
+        AddInPlace<Taken<Sign::minus, false>>(m, n, k, a, b, c, cStride);
+    return true;
+}
+
+// Whether the product is large, and has been added. Not without memory.
+template <class Field>
+bool AddIfLarge(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, typename Field::Factor factor,
+                const typename Field::Operand &a, const typename Field::Operand &b,
+                typename Field::T *c, std::ptrdiff_t cStride) {
+    if (m * n <= smallProduct / (k + 1) || m <= Field::tileRows || n <= Field::tileCols)
+        return false;
+    const PanelMemory memory;
+    if (memory.data() == nullptr)
+        return false;
+    AddLarge<Field>(m, n, k, Field::signOf(factor), factor, a, b, reinterpret_cast<DBL *>(c),
+                    cStride * Field::parts, memory.data());
+    return true;
 }
 
 } // namespace
 
+// Small products gain nothing by eight lanes.
+#ifdef QX_HAS_EIGHT_LANES
+namespace narrower = avx2;
+#else
+namespace narrower = QX_WIDTH;
+#endif
+
 void AddProductReal(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, RealFactor factor,
                     RealOperand a, RealOperand b, DBL *c, std::ptrdiff_t cStride) {
-    Add<Real>(m, n, k, factor, a, b, c, cStride);
+    if constexpr (isWide)
+        if (AddIfInPlace(m, n, k, factor, a, b, c, cStride))
+            return;
+    if (AddIfLarge<Real>(m, n, k, factor, a, b, c, cStride))
+        return;
+    if constexpr (isWide)
+        narrower::AddProductReal(m, n, k, factor, a, b, c, cStride);
+    else
+        AddSmallAs<Real, false>(m, n, k, factor, a, b, c, cStride);
 }
 void AddProductComplex(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, ComplexFactor factor,
                        ComplexOperand a, ComplexOperand b, CDB *c, std::ptrdiff_t cStride) {
-    Add<Complex>(m, n, k, factor, a, b, c, cStride);
+    if (AddIfLarge<Complex>(m, n, k, factor, a, b, c, cStride))
+        return;
+    if constexpr (isWide)
+        narrower::AddProductComplex(m, n, k, factor, a, b, c, cStride);
+    else if (a.isConjugated)
+        AddSmallAs<Complex, true>(m, n, k, factor, a, b, c, cStride);
+    else
+        AddSmallAs<Complex, false>(m, n, k, factor, a, b, c, cStride);
 }
 
 } // namespace qx::QX_WIDTH

@@ -29,11 +29,11 @@ ErrorCode Substitute(Factors factors, ConstVectorView<E> a, const MatrixView<E> 
 // times `stripWidth` doubles, or none for a single right side.
 inline constexpr int32_t stripWidth = 32;
 QX_BY_WIDTH_TO_8(void, SubstituteStrips,
-            (Factors factors, const DBL *a, std::ptrdiff_t n, std::ptrdiff_t rightSides, DBL *x,
-             DBL *strip))
+                 (Factors factors, const DBL *a, std::ptrdiff_t n, std::ptrdiff_t rightSides,
+                  DBL *x, DBL *strip))
 QX_BY_WIDTH_TO_8(void, CxSubstituteStrips,
-            (Factors factors, const CDB *a, std::ptrdiff_t n, std::ptrdiff_t rightSides, CDB *x,
-             DBL *strip))
+                 (Factors factors, const CDB *a, std::ptrdiff_t n, std::ptrdiff_t rightSides,
+                  CDB *x, DBL *strip))
 
 } // namespace qx
 

@@ -49,12 +49,8 @@ struct RealRow {
             v[i] = v[i] / L(a);
     }
     static double conjugate(const T &a) { return a; }
-    static void gather(const T *x, DBL *row) {
-        load(x).store(row);
-    }
-    static void scatter(const DBL *row, T *x) {
-        load(row).store(x);
-    }
+    static void gather(const T *x, DBL *row) { load(x).store(row); }
+    static void scatter(const DBL *row, T *x) { load(row).store(x); }
 };
 
 template <class L, int Vectors>
