@@ -62,7 +62,7 @@ void DirectAgainstTheMachine() {
                                  {out.data(), n + taps - 1});
             },
             [&] {
-                if (qx::lanesInUse == 4)
+                if (qx::lanesInUse >= 4)
                     MultiplyAndAddWide(products);
                 else
                     MultiplyAndAdd<16>(products);

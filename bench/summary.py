@@ -8,8 +8,10 @@ from pathlib import Path
 
 
 def width():
-    wide = "avx2" in Path("/proc/cpuinfo").read_text().split() and os.environ.get("QX_WIDTH") != "2"
-    return "AVX2" if wide else "SSE2"
+    flags, most = Path("/proc/cpuinfo").read_text().split(), os.environ.get("QX_WIDTH")
+    if most not in ("2", "4") and {"avx512f", "avx512dq", "avx512bw", "avx512vl"} <= set(flags):
+        return "AVX-512"
+    return "AVX2" if most != "2" and "avx2" in flags else "SSE2"
 
 
 def compiler():

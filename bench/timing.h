@@ -80,7 +80,9 @@ std::array<double, sizeof...(Work)> LeastTimes(const Work &...contestants) {
     return least;
 }
 
-inline const char *WidthInUse() { return lanesInUse == 4 ? "AVX2" : "SSE2"; }
+inline const char *WidthInUse() {
+    return lanesInUse == 8 ? "AVX-512" : lanesInUse == 4 ? "AVX2" : "SSE2";
+}
 
 #ifdef __clang__
 inline constexpr char compiler[] = "clang++ " __clang_version__;

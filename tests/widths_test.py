@@ -1,39 +1,105 @@
 #!/usr/bin/python3
-"""widths_test.py NM OBJECT...: the objects compiled for AVX2 define no function that the linker could
-take for another build of the same function: every global or weak one has its width in its name."""
+"""widths_test.py NM OBJDUMP MODULE --baseline OBJECT... --avx2 OBJECT... --avx512 OBJECT...: the objects
+of a wider build define no function that the linker could take for another build of the same function: every
+global or weak one has its width in its name. No object has an instruction above its width, and the module
+none that fuses a multiplication with an addition. Without OBJDUMP (a dash) only names are looked at."""
 
+import re
 import subprocess
 import sys
 import unittest
 
-NM = None
-OBJECTS = []
-OF_THIS_WIDTH = ("4avx2", "6lanes4")  # the namespaces, as names are mangled
+NM = OBJDUMP = MODULE = None
+OBJECTS = {}
+# The namespaces, as names are mangled.
+NAMES = {"avx2": ("4avx2", "6lanes4"), "avx512": ("6avx512", "6lanes8")}
 PLACED_BY_LINKER = set("TWi")  # functions that are global, weak or chosen at run time
+FUSED = re.compile(r"^v?f?n?m(add|sub|addsub|subadd)[1-3]*[ps][sdh]$|^vf(n?m(add|sub)|maddsub|msubadd)|^vfc?maddc")
+# Of a line of a disassembly: what only a wider processor has.
+ABOVE = {"baseline": re.compile(r"^v(?!err|erw)[a-z]|%ymm|%zmm|%k[0-7]"),
+         "avx2": re.compile(r"%zmm|%[xy]mm(1[6-9]|2\d|3[01])|%k[0-7]"),
+         "avx512": re.compile(r"^v4|^vp2intersect|^vpdp|^vpopcnt|^vpshld|^vaes|%tmm")}
+X87 = re.compile(r"^f(?!ence|xsave|xrstor|emms)[a-z]")
 
 
-def shared_functions(listing):
-    """The functions of one object, as `nm -P` lists them, that may stand in for another's."""
+def shared_functions(listing, width):
+    """The functions of one object, as `nm -P` lists them, that may be taken for another's."""
     rows = [line.split() for line in listing.splitlines()]
     return [name for name, kind, *_ in rows
-            if kind in PLACED_BY_LINKER and not any(width in name for width in OF_THIS_WIDTH)]
+            if kind in PLACED_BY_LINKER and not any(part in name for part in NAMES[width])]
+
+
+def instructions(path):
+    """Each instruction of an object or a library, from its mnemonic on."""
+    listing = subprocess.run([OBJDUMP, "-d", "--no-show-raw-insn", path], check=True, capture_output=True,
+                             text=True).stdout
+    return [line.split("\t", 1)[1] for line in listing.splitlines() if line[:1] == " " and "\t" in line]
+
+
+def found(pattern, lines):
+    return sorted({line.split()[0] for line in lines if pattern.search(line)})
 
 
 class Widths(unittest.TestCase):
-    def test_shares_no_function(self):
-        self.assertTrue(OBJECTS)
-        for path in OBJECTS:
-            with self.subTest(path):
-                listing = subprocess.run([NM, "-P", "--defined-only", path], check=True,
-                                         capture_output=True, text=True).stdout
-                self.assertIn("4avx2", listing)
-                self.assertEqual(shared_functions(listing), [])
+    def test_share_no_function(self):
+        for width in NAMES:
+            for path in OBJECTS[width]:
+                with self.subTest(path):
+                    listing = subprocess.run([NM, "-P", "--defined-only", path], check=True,
+                                             capture_output=True, text=True).stdout
+                    self.assertIn(NAMES[width][0], listing)
+                    self.assertEqual(shared_functions(listing, width), [])
 
-    def test_knows_a_shared_function(self):
-        self.assertEqual(shared_functions("_ZSt3minIiERKT_S2_S2_ W 0 6\n_ZN2qx4avx21fEv T 0 6\n_ZL1f t 8 1\n"),
-                         ["_ZSt3minIiERKT_S2_S2_"])
+    def test_know_a_shared_function(self):
+        listing = "_ZSt3minIiERKT_S2_S2_ W 0 6\n_ZN2qx4avx21fEv T 0 6\n_ZL1f t 8 1\n"
+        self.assertEqual(shared_functions(listing, "avx2"), ["_ZSt3minIiERKT_S2_S2_"])
+        self.assertIn("_ZN2qx4avx21fEv", shared_functions(listing, "avx512"))
+
+    def test_have_no_instruction_above_them(self):
+        if OBJDUMP == "-":
+            self.skipTest("names only")
+        wider = set(OBJECTS["avx2"] + OBJECTS["avx512"])
+        for width, above in ABOVE.items():
+            for path in OBJECTS[width]:
+                if width != "baseline" or path not in wider:
+                    with self.subTest(path):
+                        self.assertEqual(found(above, instructions(path)), [])
+
+    def test_fuse_nothing_and_leave_x87_alone(self):
+        if OBJDUMP == "-":
+            self.skipTest("names only")
+        lines = instructions(MODULE)
+        self.assertGreater(len(lines), 100000)
+        self.assertEqual(found(FUSED, lines), [])
+        if MODULE.endswith(".dll"):
+            self.skipTest("on 32-bit processors results are handed back through x87")
+        self.assertEqual(found(X87, lines), [])
+
+    def test_know_the_instructions(self):
+        for line in ("vfmadd231pd %zmm1,%zmm0,%zmm2", "vfnmsub132sd %xmm1,%xmm0,%xmm2",
+                     "vfmaddsub213pd %ymm1,%ymm0,%ymm2", "vfmsubadd213ps (%rax),%ymm0,%ymm2"):
+            self.assertTrue(FUSED.search(line.split()[0]), line)
+        for line in ("vmulpd %ymm1,%ymm0,%ymm2", "vaddsubpd %ymm1,%ymm0,%ymm2"):
+            self.assertFalse(FUSED.search(line.split()[0]), line)
+            self.assertFalse(ABOVE["avx2"].search(line))
+            self.assertTrue(ABOVE["baseline"].search(line))
+        self.assertTrue(ABOVE["avx2"].search("vaddpd %ymm17,%ymm0,%ymm2"))
+        self.assertTrue(ABOVE["avx2"].search("vaddpd (%rax),%ymm0,%ymm2{%k1}"))
+        self.assertTrue(X87.search("fldl 0x8(%rsp)"))
+
+
+def lists(words):
+    """What follows each option."""
+    by_width = {width: [] for width in ABOVE}
+    for word in words:
+        if word.startswith("--"):
+            width = word[2:]
+        else:
+            by_width[width].append(word)
+    return by_width
 
 
 if __name__ == "__main__":
-    NM, *OBJECTS = sys.argv[1:]
+    NM, OBJDUMP, MODULE, *words = sys.argv[1:]
+    OBJECTS = lists(words)
     unittest.main(argv=sys.argv[:1])

@@ -145,9 +145,10 @@ public:
                            std::max<std::ptrdiff_t>(256, 8 * width_))) {}
 
     // A window passes through all ranks at each step, which only pays if it is short, and each
-    // stretch begins with a sort.
+    // stretch begins with a sort. Up to four values at a time.
     static bool pays(const Job &job) {
-        return job.width() <= 64 * lanesInUse && job.n / (2 * medianStretches) >= job.width();
+        return job.width() <= 64 * std::min(lanesInUse, 4) &&
+               job.n / (2 * medianStretches) >= job.width();
     }
 
     ErrorCode run() {

@@ -1,6 +1,7 @@
 #ifndef QX_FRAME_EXPORT_H
 #define QX_FRAME_EXPORT_H
 
+#include "frame/arithmetic.h"
 #include "frame/arrays.h"
 
 #include <array>
@@ -31,6 +32,8 @@ namespace qx {
 //   - a record of the caller's that carries arrays is a class which names those that are inputs by
 //     inputs(), a tuple of references to its views, and the others by outputs(), a tuple of what
 //     their identity() gives.
+//   - the body runs in the arithmetic in which results are defined (frame/arithmetic.h), whatever the host
+//     has set; so do calls of the host within it, and an export without a frame has the line for itself.
 //   - everything else (numbers, plain pointers, plan keepers) is handed on as it is.
 // A body is a function or a lambda whose parameters have their types written out; it returns an
 // Outcome or an ErrorCode. What a twin does differently is a template argument of its body, or a
@@ -164,6 +167,7 @@ struct FrameOf<Result (Lambda::*)(Parameters...) const> {
 
 template <class Body, class... Arguments>
 Outcome RunFrame(Body body, Arguments &&...arguments) {
+    const DefaultArithmetic arithmetic;
     typename FrameOf<Body>::type frame(std::forward<Arguments>(arguments)...);
     const Outcome outcome = frame.run(body);
     if (outcome.failed())

@@ -7,8 +7,8 @@
 
 namespace qx {
 
-// Comparisons of lanes, choices by them, the bits of numbers, and lanes moved by one, for Lanes<2>
-// and Lanes<4>.
+// Comparisons of lanes, choices by them, the bits of numbers, and lanes moved by one, for Lanes<2>,
+// Lanes<4> and Lanes<8>.
 
 template <class L>
 using BitsOf = typename LaneInteger<L::count>::type;
@@ -108,8 +108,10 @@ template <int N>
 QX_INLINE Lanes<N> MovedUp(Lanes<N> before, Lanes<N> value) {
     if constexpr (N == 2)
         return Lanes<N>(__builtin_shufflevector(before.v, value.v, 1, 2));
-    else
+    else if constexpr (N == 4)
         return Lanes<N>(__builtin_shufflevector(before.v, value.v, 3, 4, 5, 6));
+    else
+        return Lanes<N>(__builtin_shufflevector(before.v, value.v, 7, 8, 9, 10, 11, 12, 13, 14));
 }
 
 } // namespace qx

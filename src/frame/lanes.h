@@ -10,6 +10,14 @@
 // Operations become part of the loop that uses them, at every level of optimisation.
 #define QX_INLINE __attribute__((always_inline)) inline
 
+// Before a loop of at most eight rounds over an array of vectors, which then stays in registers: by
+// itself g++ 12 unrolls some of them too late for that.
+#ifdef __clang__
+#define QX_UNROLLED _Pragma("unroll")
+#else
+#define QX_UNROLLED _Pragma("GCC unroll 8")
+#endif
+
 namespace qx {
 
 // SIMD over independent elements: Lanes<N> holds N doubles, and every operation does in each lane
@@ -22,12 +30,15 @@ namespace qx {
 //     for (; i + nativeLanes <= n; i += nativeLanes) ScaleSome<Lanes<nativeLanes>>(x + i, f);
 //     for (; i < n; ++i) ScaleSome<Lanes<1>>(x + i, f);
 //
-// Memory need not be aligned. N is 1, 2 or 4. What depends on the instruction set is here and
+// Memory need not be aligned. N is 1, 2, 4 or 8. What depends on the instruction set is here and
 // nowhere else; comparisons and choices are in frame/lane_masks.h.
 
 // What the instruction set of the build offers. Each build has its own of all that follows, so that
 // none of it can stand in for that of another.
-#ifdef __AVX2__
+#ifdef __AVX512F__
+inline namespace lanes8 {
+constexpr int nativeLanes = 8;
+#elif defined(__AVX2__)
 inline namespace lanes4 {
 constexpr int nativeLanes = 4;
 #else
@@ -49,6 +60,12 @@ struct LaneVector<4> {
     typedef double inMemory __attribute__((vector_size(32), aligned(1), may_alias));
     static QX_INLINE type broadcast(double x) { return type{x, x, x, x}; }
 };
+template <>
+struct LaneVector<8> {
+    typedef double type __attribute__((vector_size(64)));
+    typedef double inMemory __attribute__((vector_size(64), aligned(1), may_alias));
+    static QX_INLINE type broadcast(double x) { return type{x, x, x, x, x, x, x, x}; }
+};
 
 template <int N>
 struct LaneInteger;
@@ -59,6 +76,10 @@ struct LaneInteger<2> {
 template <>
 struct LaneInteger<4> {
     typedef int64_t type __attribute__((vector_size(32)));
+};
+template <>
+struct LaneInteger<8> {
+    typedef int64_t type __attribute__((vector_size(64)));
 };
 
 template <int N>
@@ -81,12 +102,38 @@ public:
         *reinterpret_cast<typename LaneVector<N>::inMemory *>(x) = v;
     }
 
+    // The first `count` elements, with zeros in the lanes behind; and these alone back to memory.
+    static QX_INLINE Lanes loadFirst(const DBL *x, std::ptrdiff_t count) {
+#ifdef __AVX512F__
+        if constexpr (N == 8)
+            return Lanes(
+                __builtin_ia32_loadupd512_mask(reinterpret_cast<const double *>(x), Vector{},
+                                               static_cast<unsigned char>((1U << count) - 1)));
+#endif
+        Vector first = {};
+        for (std::ptrdiff_t i = 0; i < count; ++i)
+            first[i] = x[i];
+        return Lanes(first);
+    }
+    QX_INLINE void storeFirst(DBL *x, std::ptrdiff_t count) const {
+#ifdef __AVX512F__
+        if constexpr (N == 8)
+            return __builtin_ia32_storeupd512_mask(reinterpret_cast<double *>(x), v,
+                                                   static_cast<unsigned char>((1U << count) - 1));
+#endif
+        for (std::ptrdiff_t i = 0; i < count; ++i)
+            x[i] = v[i];
+    }
+
     // Elements 0, stride, 2 stride, ...
     static QX_INLINE Lanes gather(const DBL *x, std::ptrdiff_t stride) {
         if constexpr (N == 2)
             return Lanes(Vector{x[0], x[stride]});
-        else
+        else if constexpr (N == 4)
             return Lanes(Vector{x[0], x[stride], x[2 * stride], x[3 * stride]});
+        else
+            return Lanes(Vector{x[0], x[stride], x[2 * stride], x[3 * stride], x[4 * stride],
+                                x[5 * stride], x[6 * stride], x[7 * stride]});
     }
     QX_INLINE void scatter(DBL *x, std::ptrdiff_t stride) const {
         for (int i = 0; i < N; ++i)
@@ -97,8 +144,10 @@ public:
     QX_INLINE Lanes reversed() const {
         if constexpr (N == 2)
             return Lanes(__builtin_shufflevector(v, v, 1, 0));
-        else
+        else if constexpr (N == 4)
             return Lanes(__builtin_shufflevector(v, v, 3, 2, 1, 0));
+        else
+            return Lanes(__builtin_shufflevector(v, v, 7, 6, 5, 4, 3, 2, 1, 0));
     }
 
     // Of the values of a, followed by those of b, every second one from the first or from the
@@ -107,41 +156,53 @@ public:
     friend QX_INLINE Lanes Evens(Lanes a, Lanes b) {
         if constexpr (N == 2)
             return Lanes(__builtin_shufflevector(a.v, b.v, 0, 2));
-        else
+        else if constexpr (N == 4)
             return Lanes(__builtin_shufflevector(a.v, b.v, 0, 2, 4, 6));
+        else
+            return Lanes(__builtin_shufflevector(a.v, b.v, 0, 2, 4, 6, 8, 10, 12, 14));
     }
     friend QX_INLINE Lanes Odds(Lanes a, Lanes b) {
         if constexpr (N == 2)
             return Lanes(__builtin_shufflevector(a.v, b.v, 1, 3));
-        else
+        else if constexpr (N == 4)
             return Lanes(__builtin_shufflevector(a.v, b.v, 1, 3, 5, 7));
+        else
+            return Lanes(__builtin_shufflevector(a.v, b.v, 1, 3, 5, 7, 9, 11, 13, 15));
     }
     friend QX_INLINE Lanes TurnsLow(Lanes a, Lanes b) {
         if constexpr (N == 2)
             return Lanes(__builtin_shufflevector(a.v, b.v, 0, 2));
-        else
+        else if constexpr (N == 4)
             return Lanes(__builtin_shufflevector(a.v, b.v, 0, 4, 1, 5));
+        else
+            return Lanes(__builtin_shufflevector(a.v, b.v, 0, 8, 1, 9, 2, 10, 3, 11));
     }
     friend QX_INLINE Lanes TurnsHigh(Lanes a, Lanes b) {
         if constexpr (N == 2)
             return Lanes(__builtin_shufflevector(a.v, b.v, 1, 3));
-        else
+        else if constexpr (N == 4)
             return Lanes(__builtin_shufflevector(a.v, b.v, 2, 6, 3, 7));
+        else
+            return Lanes(__builtin_shufflevector(a.v, b.v, 4, 12, 5, 13, 6, 14, 7, 15));
     }
 
-    // a and b interleaved pair by pair: with lanes numbered from 0, the low half is a0 b0 (a2 b2),
-    // the high half a1 b1 (a3 b3). The same operations take the pairs apart again.
+    // a and b interleaved pair by pair: with lanes numbered from 0, the low half is a0 b0 (a2 b2 ...),
+    // the high half a1 b1 (a3 b3 ...). The same operations take the pairs apart again.
     friend QX_INLINE Lanes PairsLow(Lanes a, Lanes b) {
         if constexpr (N == 2)
             return Lanes(__builtin_shufflevector(a.v, b.v, 0, 2));
-        else
+        else if constexpr (N == 4)
             return Lanes(__builtin_shufflevector(a.v, b.v, 0, 4, 2, 6));
+        else
+            return Lanes(__builtin_shufflevector(a.v, b.v, 0, 8, 2, 10, 4, 12, 6, 14));
     }
     friend QX_INLINE Lanes PairsHigh(Lanes a, Lanes b) {
         if constexpr (N == 2)
             return Lanes(__builtin_shufflevector(a.v, b.v, 1, 3));
-        else
+        else if constexpr (N == 4)
             return Lanes(__builtin_shufflevector(a.v, b.v, 1, 5, 3, 7));
+        else
+            return Lanes(__builtin_shufflevector(a.v, b.v, 1, 9, 3, 11, 5, 13, 7, 15));
     }
 
     QX_INLINE double operator[](int lane) const { return v[lane]; }
@@ -179,6 +240,21 @@ public:
     double v;
 };
 
+// x times the number at `factor`, in every lane.
+template <int N>
+QX_INLINE Lanes<N> Times(Lanes<N> x, const DBL *factor) {
+#if defined(__AVX512F__) && !defined(__clang__)
+    // One instruction, which g++ splits where the number is used again: but to fill a vector of eight
+    // lanes takes the place of arithmetic on AMD's Zen 4, and to read it with each product does not.
+    if constexpr (N == 8) {
+        typename Lanes<N>::Vector product;
+        __asm__("vmulpd %2%{1to8%}, %1, %0" : "=v"(product) : "v"(x.v), "m"(*factor));
+        return Lanes<N>(product);
+    }
+#endif
+    return Lanes<N>(*factor) * x;
+}
+
 // ---- Neighbouring lanes as pairs, such as the parts of complex values ----
 
 // The first and the second value of each pair, twice.
@@ -186,39 +262,49 @@ template <int N>
 QX_INLINE Lanes<N> FirstsTwice(Lanes<N> x) {
     if constexpr (N == 2)
         return Lanes<N>(__builtin_shufflevector(x.v, x.v, 0, 0));
-    else
+    else if constexpr (N == 4)
         return Lanes<N>(__builtin_shufflevector(x.v, x.v, 0, 0, 2, 2));
+    else
+        return Lanes<N>(__builtin_shufflevector(x.v, x.v, 0, 0, 2, 2, 4, 4, 6, 6));
 }
 template <int N>
 QX_INLINE Lanes<N> SecondsTwice(Lanes<N> x) {
     if constexpr (N == 2)
         return Lanes<N>(__builtin_shufflevector(x.v, x.v, 1, 1));
-    else
+    else if constexpr (N == 4)
         return Lanes<N>(__builtin_shufflevector(x.v, x.v, 1, 1, 3, 3));
+    else
+        return Lanes<N>(__builtin_shufflevector(x.v, x.v, 1, 1, 3, 3, 5, 5, 7, 7));
 }
 // The values of each pair exchanged.
 template <int N>
 QX_INLINE Lanes<N> Swapped(Lanes<N> x) {
     if constexpr (N == 2)
         return x.reversed();
-    else
+    else if constexpr (N == 4)
         return Lanes<N>(__builtin_shufflevector(x.v, x.v, 1, 0, 3, 2));
+    else
+        return Lanes<N>(__builtin_shufflevector(x.v, x.v, 1, 0, 3, 2, 5, 4, 7, 6));
 }
 // The pairs in the opposite order.
 template <int N>
 QX_INLINE Lanes<N> ReversedPairs(Lanes<N> x) {
     if constexpr (N == 2)
         return x;
-    else
+    else if constexpr (N == 4)
         return Lanes<N>(__builtin_shufflevector(x.v, x.v, 2, 3, 0, 1));
+    else
+        return Lanes<N>(__builtin_shufflevector(x.v, x.v, 6, 7, 4, 5, 2, 3, 0, 1));
 }
 // One pair in the place of all.
 template <int N>
 QX_INLINE Lanes<N> InEveryPair(Lanes<2> x) {
     if constexpr (N == 2)
         return x;
-    else
+    else if constexpr (N == 4)
         return Lanes<N>(__builtin_shufflevector(x.v, x.v, 0, 1, 0, 1));
+    else
+        return Lanes<N>(__builtin_shufflevector(x.v, x.v, 0, 1, 0, 1, 0, 1, 0, 1));
 }
 // The first values of all pairs, or the second ones, with the opposite sign.
 template <int N>
@@ -228,8 +314,10 @@ QX_INLINE Lanes<N> NegatedInPairs(Lanes<N> x, bool first) {
     Bits sign;
     if constexpr (N == 2)
         sign = Bits{one, other};
-    else
+    else if constexpr (N == 4)
         sign = Bits{one, other, one, other};
+    else
+        sign = Bits{one, other, one, other, one, other, one, other};
     return Lanes<N>((typename Lanes<N>::Vector)((Bits)x.v ^ sign));
 }
 // a with the first values less those of b, the second ones plus those of b.
@@ -243,6 +331,9 @@ QX_INLINE Lanes<2> MinusPlus(Lanes<2> a, Lanes<2> b) {
 QX_INLINE Lanes<4> MinusPlus(Lanes<4> a, Lanes<4> b) {
     return Lanes<4>(__builtin_shufflevector((a - b).v, (a + b).v, 0, 5, 2, 7));
 }
+QX_INLINE Lanes<8> MinusPlus(Lanes<8> a, Lanes<8> b) {
+    return Lanes<8>(__builtin_shufflevector((a - b).v, (a + b).v, 0, 9, 2, 11, 4, 13, 6, 15));
+}
 
 // Pairs from N / 2 places, and back.
 template <int N>
@@ -250,8 +341,11 @@ QX_INLINE Lanes<N> LoadPairs(const DBL *const *from, std::ptrdiff_t at) {
     const Lanes<2> a = Lanes<2>::load(from[0] + at);
     if constexpr (N == 2)
         return a;
-    else
+    else if constexpr (N == 4)
         return Lanes<N>(__builtin_shufflevector(a.v, Lanes<2>::load(from[1] + at).v, 0, 1, 2, 3));
+    else
+        return Lanes<N>(__builtin_shufflevector(
+            LoadPairs<4>(from, at).v, LoadPairs<4>(from + 2, at).v, 0, 1, 2, 3, 4, 5, 6, 7));
 }
 QX_INLINE void StorePairs(Lanes<2> pairs, DBL *const *to, std::ptrdiff_t at) {
     pairs.store(to[0] + at);
@@ -265,17 +359,40 @@ QX_INLINE void StorePairs(Lanes<4> pairs, DBL *const *to, std::ptrdiff_t at) {
     Lanes<2>(__builtin_shufflevector(pairs.v, pairs.v, 2, 3)).store(to[1] + at);
 #endif
 }
+QX_INLINE void StorePairs(Lanes<8> pairs, DBL *const *to, std::ptrdiff_t at) {
+    StorePairs(Lanes<4>(__builtin_shufflevector(pairs.v, pairs.v, 0, 1, 2, 3)), to, at);
+    StorePairs(Lanes<4>(__builtin_shufflevector(pairs.v, pairs.v, 4, 5, 6, 7)), to + 2, at);
+}
 
 // ---- Other lanes ----
+
+// A square block of as many vectors as they have lanes: lane j of vector i and lane i of vector j
+// exchange places. By turns each half of the vectors, as often as N halves.
+template <int N>
+QX_INLINE void Transpose(Lanes<N> *block) {
+    for (int half = N; half > 1; half /= 2) {
+        Lanes<N> turned[N];
+        for (int i = 0; i < N / 2; ++i) {
+            turned[2 * i] = TurnsLow(block[i], block[i + N / 2]);
+            turned[2 * i + 1] = TurnsHigh(block[i], block[i + N / 2]);
+        }
+        for (int i = 0; i < N; ++i)
+            block[i] = turned[i];
+    }
+}
 
 // One value from each of N places.
 template <int N>
 QX_INLINE Lanes<N> LoadEach(const DBL *const *from, std::ptrdiff_t at) {
     if constexpr (N == 2)
         return Lanes<N>(typename Lanes<N>::Vector{from[0][at], from[1][at]});
-    else
+    else if constexpr (N == 4)
         return Lanes<N>(
             typename Lanes<N>::Vector{from[0][at], from[1][at], from[2][at], from[3][at]});
+    else
+        return Lanes<N>(typename Lanes<N>::Vector{from[0][at], from[1][at], from[2][at],
+                                                  from[3][at], from[4][at], from[5][at],
+                                                  from[6][at], from[7][at]});
 }
 
 // The sign bits of the lanes, that of lane 0 lowest.
@@ -288,6 +405,15 @@ QX_INLINE unsigned SignBits(Lanes<4> x) {
 #else
     return SignBits(Lanes<2>(__builtin_shufflevector(x.v, x.v, 0, 1))) |
            SignBits(Lanes<2>(__builtin_shufflevector(x.v, x.v, 2, 3))) << 2;
+#endif
+}
+QX_INLINE unsigned SignBits(Lanes<8> x) {
+#ifdef __AVX512DQ__
+    typedef long long Eight __attribute__((vector_size(64)));
+    return static_cast<unsigned>(__builtin_ia32_cvtq2mask512((Eight)x.v));
+#else
+    return SignBits(Lanes<4>(__builtin_shufflevector(x.v, x.v, 0, 1, 2, 3))) |
+           SignBits(Lanes<4>(__builtin_shufflevector(x.v, x.v, 4, 5, 6, 7))) << 4;
 #endif
 }
 
@@ -307,11 +433,18 @@ QX_INLINE typename LaneInteger<N>::type LowerProducts(typename LaneInteger<N>::t
         return (typename LaneInteger<N>::type)__builtin_ia32_pmuludq256((EightHalves)a,
                                                                         (EightHalves)b);
 #endif
+#ifdef __AVX512F__
+    typedef int SixteenHalves __attribute__((vector_size(64)));
+    typedef long long Eight __attribute__((vector_size(64)));
+    if constexpr (N == 8)
+        return (typename LaneInteger<N>::type)__builtin_ia32_pmuludq512_mask(
+            (SixteenHalves)a, (SixteenHalves)b, Eight{}, 0xff);
+#endif
 #endif
     return (a & 0xffffffff) * (b & 0xffffffff);
 }
 
-// N floats: the few operations that sums of products need. N is 1, 4 or 8.
+// N floats: the few operations that sums of products need. N is 1, 4, 8 or 16.
 template <int N>
 struct FloatLaneVector;
 template <>
@@ -325,6 +458,14 @@ struct FloatLaneVector<8> {
     typedef float type __attribute__((vector_size(32)));
     typedef float inMemory __attribute__((vector_size(32), aligned(1), may_alias));
     static QX_INLINE type broadcast(float x) { return type{x, x, x, x, x, x, x, x}; }
+};
+template <>
+struct FloatLaneVector<16> {
+    typedef float type __attribute__((vector_size(64)));
+    typedef float inMemory __attribute__((vector_size(64), aligned(1), may_alias));
+    static QX_INLINE type broadcast(float x) {
+        return type{x, x, x, x, x, x, x, x, x, x, x, x, x, x, x, x};
+    }
 };
 
 template <int N>

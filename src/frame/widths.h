@@ -16,6 +16,9 @@
 //     }
 //     }
 //
+// QX_BY_WIDTH_TO_8 in the place of QX_BY_WIDTH, and WIDE_LANES in that of LANES, are for what gains by
+// eight lanes as well; the others run with four there.
+//
 // Everybody calls qx::AddArrays(...), which costs one well-predicted branch more than a plain
 // function. It is an object: it has no overloads, no default arguments and no address. Routines of
 // one width call each other directly, for they find the name in their own namespace first.
@@ -28,11 +31,18 @@
 #define QX_WIDTH baseline
 #endif
 
+// Where there are routines of eight lanes (cmake/QxFamily.cmake asks the same). Not on Windows: g++
+// keeps 64-byte vectors on the stack with aligned stores and does not align the stack for them there
+// (its report 54412). Not on 32-bit processors, which have eight registers in place of 32.
+#if defined(__x86_64__) && !defined(_WIN32)
+#define QX_HAS_EIGHT_LANES
+#endif
+
 namespace qx {
 
-// The lanes of the routines that are called, 2 or 4: the most that processor and operating system
-// offer. QX_WIDTH=2 in the environment forces the smaller one. It is found when the module is
-// loaded, ahead of static initialisers; whoever comes still earlier meets 2.
+// The lanes of the routines that are called, 2, 4 or 8: the most that processor and operating system
+// offer, and the build has. QX_WIDTH=2 or QX_WIDTH=4 in the environment forces a smaller one. It is
+// found when the module is loaded, ahead of static initialisers; whoever comes still earlier meets 2.
 extern int32_t lanesInUse;
 
 template <auto Baseline, auto Avx2>
@@ -41,7 +51,19 @@ template <class Result, class... Arguments, Result (*Baseline)(Arguments...),
           Result (*Avx2)(Arguments...)>
 struct ByWidth<Baseline, Avx2> {
     __attribute__((always_inline)) Result operator()(Arguments... arguments) const {
-        return lanesInUse == 4 ? Avx2(arguments...) : Baseline(arguments...);
+        return lanesInUse >= 4 ? Avx2(arguments...) : Baseline(arguments...);
+    }
+};
+
+template <auto Baseline, auto Avx2, auto Avx512>
+struct ByWidthTo8;
+template <class Result, class... Arguments, Result (*Baseline)(Arguments...),
+          Result (*Avx2)(Arguments...), Result (*Avx512)(Arguments...)>
+struct ByWidthTo8<Baseline, Avx2, Avx512> {
+    __attribute__((always_inline)) Result operator()(Arguments... arguments) const {
+        return lanesInUse == 8   ? Avx512(arguments...)
+               : lanesInUse == 4 ? Avx2(arguments...)
+                                 : Baseline(arguments...);
     }
 };
 
@@ -55,5 +77,21 @@ struct ByWidth<Baseline, Avx2> {
     result name parameters;                                                                        \
     }                                                                                              \
     constexpr ByWidth<baseline::name, avx2::name> name{};
+
+#ifdef QX_HAS_EIGHT_LANES
+#define QX_BY_WIDTH_TO_8(result, name, parameters)                                                 \
+    namespace baseline {                                                                           \
+    result name parameters;                                                                        \
+    }                                                                                              \
+    namespace avx2 {                                                                               \
+    result name parameters;                                                                        \
+    }                                                                                              \
+    namespace avx512 {                                                                             \
+    result name parameters;                                                                        \
+    }                                                                                              \
+    constexpr ByWidthTo8<baseline::name, avx2::name, avx512::name> name{};
+#else
+#define QX_BY_WIDTH_TO_8(result, name, parameters) QX_BY_WIDTH(result, name, parameters)
+#endif
 
 #endif

@@ -13,25 +13,29 @@ namespace qx {
 // apart. Every element has one order of arithmetic, whatever the width.
 
 // y[j] += sum over i of x[i] a[i][j], i ascending.
-QX_BY_WIDTH(void, AddTransposedProductReal,
-            (const DBL *a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const DBL *x, DBL *y))
-QX_BY_WIDTH(void, AddTransposedProductComplex,
-            (const CDB *a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const CDB *x, CDB *y))
+QX_BY_WIDTH_TO_8(void, AddTransposedProductReal,
+                 (const DBL *a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const DBL *x,
+                  DBL *y))
+QX_BY_WIDTH_TO_8(void, AddTransposedProductComplex,
+                 (const CDB *a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const CDB *x,
+                  CDB *y))
 
 // a[i][j] += x[i] y[j].
-QX_BY_WIDTH(void, AddOuterProductReal,
-            (DBL * a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const DBL *x,
-             const DBL *y))
-QX_BY_WIDTH(void, AddOuterProductComplex,
-            (CDB * a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const CDB *x,
-             const CDB *y))
+QX_BY_WIDTH_TO_8(void, AddOuterProductReal,
+                 (DBL * a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const DBL *x,
+                  const DBL *y))
+QX_BY_WIDTH_TO_8(void, AddOuterProductComplex,
+                 (CDB * a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const CDB *x,
+                  const CDB *y))
 
 // y[i] = sum over j of a[i][j] x[j]. Real sums run in eight partial sums, element j in sum j mod
 // 8, which are then added pairwise, and the last (cols mod 8) terms follow; complex ones in two.
-QX_BY_WIDTH(void, RowProductsReal,
-            (const DBL *a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const DBL *x, DBL *y))
-QX_BY_WIDTH(void, RowProductsComplex,
-            (const CDB *a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const CDB *x, CDB *y))
+QX_BY_WIDTH_TO_8(void, RowProductsReal,
+                 (const DBL *a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const DBL *x,
+                  DBL *y))
+QX_BY_WIDTH_TO_8(void, RowProductsComplex,
+                 (const CDB *a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const CDB *x,
+                  CDB *y))
 
 // Rows p and q become c p + s q and c q - s p.
 struct Rotation {
@@ -39,12 +43,12 @@ struct Rotation {
     double c, s;
 };
 // The rotations one after the other, on rows of `width` doubles.
-QX_BY_WIDTH(void, RotateRows,
-            (DBL * a, std::ptrdiff_t stride, int32_t width, const Rotation *rotations,
-             int32_t count))
+QX_BY_WIDTH_TO_8(void, RotateRows,
+                 (DBL * a, std::ptrdiff_t stride, int32_t width, const Rotation *rotations,
+                  int32_t count))
 
 // Rows p and q become c p + s q and c q - conj(s) p.
-QX_BY_WIDTH(void, RotateComplexRows, (CDB * p, CDB *q, int32_t width, double c, CDB s))
+QX_BY_WIDTH_TO_8(void, RotateComplexRows, (CDB * p, CDB *q, int32_t width, double c, CDB s))
 
 // Rows first, first + 1 and, where size is 3, first + 2 each lose w[i] p, where p = u[0] row0 +
 // u[1] row1 + u[2] row2.
@@ -53,12 +57,12 @@ struct SmallReflection {
     double u[3], w[3];
 };
 // The reflections one after the other, on rows of `width` doubles.
-QX_BY_WIDTH(void, ReflectRows,
-            (DBL * a, std::ptrdiff_t stride, int32_t width, const SmallReflection *reflections,
-             int32_t count))
+QX_BY_WIDTH_TO_8(void, ReflectRows,
+                 (DBL * a, std::ptrdiff_t stride, int32_t width, const SmallReflection *reflections,
+                  int32_t count))
 // The same on columns, of the first `rows` rows.
-QX_BY_WIDTH(void, ReflectColumns,
-            (DBL * a, std::ptrdiff_t stride, int32_t rows, const SmallReflection *reflection))
+QX_BY_WIDTH_TO_8(void, ReflectColumns,
+                 (DBL * a, std::ptrdiff_t stride, int32_t rows, const SmallReflection *reflection))
 
 // The first three for either element. x and y have as many elements as a has rows or columns.
 template <ElementType E>

@@ -4,58 +4,39 @@
 
 namespace qx::QX_WIDTH {
 
-// Complex numbers in a vector, (re, im) by turns: each with its parts exchanged, and with its real
-// or its imaginary part in the place of both.
-static QX_INLINE Lanes<2> Exchanged(Lanes<2> z) {
-    return Lanes<2>(__builtin_shufflevector(z.v, z.v, 1, 0));
-}
-static QX_INLINE Lanes<2> RealParts(Lanes<2> z) {
-    return Lanes<2>(__builtin_shufflevector(z.v, z.v, 0, 0));
-}
-static QX_INLINE Lanes<2> ImaginaryParts(Lanes<2> z) {
-    return Lanes<2>(__builtin_shufflevector(z.v, z.v, 1, 1));
-}
 // (-x, x) by turns.
 template <class L>
 static QX_INLINE L NegativeFirst(double x) {
-    if constexpr (L::count == 2)
-        return L(typename L::Vector{-x, x});
-    else
-        return L(typename L::Vector{-x, x, -x, x});
+    return NegatedInPairs(L(x), true);
 }
-#ifdef __AVX2__
-static QX_INLINE Lanes<4> Exchanged(Lanes<4> z) {
-    return Lanes<4>(__builtin_shufflevector(z.v, z.v, 1, 0, 3, 2));
+
+// y += the sum of x[i] a[i], rows after each other, for as many elements as a vector has.
+template <class L, int Rows>
+static QX_INLINE void AddSomeOfRows(const DBL *a, std::ptrdiff_t stride, const DBL *x, DBL *y) {
+    L sum = L::load(y);
+    for (int r = 0; r < Rows; ++r)
+        sum = sum + L(x[r]) * L::load(a + r * stride);
+    sum.store(y);
 }
-static QX_INLINE Lanes<4> RealParts(Lanes<4> z) {
-    return Lanes<4>(__builtin_shufflevector(z.v, z.v, 0, 0, 2, 2));
+
+template <int Rows>
+static void AddRows(const DBL *a, std::ptrdiff_t stride, int32_t cols, const DBL *x, DBL *y) {
+    int32_t j = 0;
+    for (; j + nativeLanes <= cols; j += nativeLanes)
+        AddSomeOfRows<Lanes<nativeLanes>, Rows>(a + j, stride, x, y + j);
+    for (; j + 2 <= cols; j += 2)
+        AddSomeOfRows<Lanes<2>, Rows>(a + j, stride, x, y + j);
+    if (j < cols)
+        AddSomeOfRows<Lanes<1>, Rows>(a + j, stride, x, y + j);
 }
-static QX_INLINE Lanes<4> ImaginaryParts(Lanes<4> z) {
-    return Lanes<4>(__builtin_shufflevector(z.v, z.v, 1, 1, 3, 3));
-}
-#endif
 
 void AddTransposedProductReal(const DBL *a, std::ptrdiff_t stride, int32_t rows, int32_t cols,
                               const DBL *x, DBL *y) {
     int32_t i = 0;
-    for (; i + 4 <= rows; i += 4) {
-        const DBL *const row = a + i * stride;
-        const double x0 = x[i], x1 = x[i + 1], x2 = x[i + 2], x3 = x[i + 3];
-        for (int32_t j = 0; j < cols; ++j) {
-            double sum = y[j];
-            sum += x0 * row[j];
-            sum += x1 * row[j + stride];
-            sum += x2 * row[j + 2 * stride];
-            sum += x3 * row[j + 3 * stride];
-            y[j] = sum;
-        }
-    }
-    for (; i < rows; ++i) {
-        const DBL *const row = a + i * stride;
-        const double factor = x[i];
-        for (int32_t j = 0; j < cols; ++j)
-            y[j] += factor * row[j];
-    }
+    for (; i + 4 <= rows; i += 4)
+        AddRows<4>(a + i * stride, stride, cols, x + i, y);
+    for (; i < rows; ++i)
+        AddRows<1>(a + i * stride, stride, cols, x + i, y);
 }
 
 // y += the sum of x[i] a[i], rows after each other, for as many elements as a vector has.
@@ -64,7 +45,7 @@ static QX_INLINE void AddComplexRows(const DBL *a, std::ptrdiff_t stride, const 
     L sum = L::load(y);
     for (int r = 0; r < Rows; ++r) {
         const L row = L::load(a + r * stride);
-        sum = sum + (L(x[r].re) * row + NegativeFirst<L>(x[r].im) * Exchanged(row));
+        sum = sum + (L(x[r].re) * row + NegativeFirst<L>(x[r].im) * Swapped(row));
     }
     sum.store(y);
 }
@@ -93,12 +74,8 @@ void AddTransposedProductComplex(const CDB *a, std::ptrdiff_t stride, int32_t ro
 
 void AddOuterProductReal(DBL *a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const DBL *x,
                          const DBL *y) {
-    for (int32_t i = 0; i < rows; ++i) {
-        DBL *const row = a + i * stride;
-        const double factor = x[i];
-        for (int32_t j = 0; j < cols; ++j)
-            row[j] += factor * y[j];
-    }
+    for (int32_t i = 0; i < rows; ++i)
+        AddRows<1>(y, 0, cols, x + i, a + i * stride);
 }
 
 void AddOuterProductComplex(CDB *a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const CDB *x,
@@ -153,8 +130,8 @@ void RowProductsReal(const DBL *a, std::ptrdiff_t stride, int32_t rows, int32_t 
 // Elements 2 j and 2 j + 1 of the rows go into sums of their own.
 template <int Rows>
 static void ComplexDotRows(const CDB *a, std::ptrdiff_t stride, int32_t n, const CDB *x, CDB *y) {
-    typedef Lanes<nativeLanes> L;
-    constexpr int32_t vectors = 4 / nativeLanes;
+    typedef Lanes<nativeLanes == 2 ? 2 : 4> L;
+    constexpr int32_t vectors = 4 / L::count;
     const L sign = NegativeFirst<L>(1.0);
     L partial[Rows][vectors];
     for (int r = 0; r < Rows; ++r)
@@ -163,18 +140,18 @@ static void ComplexDotRows(const CDB *a, std::ptrdiff_t stride, int32_t n, const
     int32_t j = 0;
     for (; j + 2 <= n; j += 2)
         for (int32_t v = 0; v < vectors; ++v) {
-            const L factor = L::load(&x[j].re + v * nativeLanes);
-            const L turned = Exchanged(factor) * sign;
+            const L factor = L::load(&x[j].re + v * L::count);
+            const L turned = Swapped(factor) * sign;
             for (int r = 0; r < Rows; ++r) {
-                const L row = L::load(&a[r * stride + j].re + v * nativeLanes);
+                const L row = L::load(&a[r * stride + j].re + v * L::count);
                 partial[r][v] =
-                    partial[r][v] + (RealParts(row) * factor + ImaginaryParts(row) * turned);
+                    partial[r][v] + (FirstsTwice(row) * factor + SecondsTwice(row) * turned);
             }
         }
     for (int r = 0; r < Rows; ++r) {
         DBL p[4];
         for (int32_t v = 0; v < vectors; ++v)
-            partial[r][v].store(p + v * nativeLanes);
+            partial[r][v].store(p + v * L::count);
         if (j < n) {
             const CDB &z = a[r * stride + j];
             p[0] += z.re * x[j].re - z.im * x[j].im;
@@ -224,8 +201,8 @@ void RotateRows(DBL *a, std::ptrdiff_t stride, int32_t width, const Rotation *ro
 template <class L>
 static QX_INLINE void RotateComplexSome(DBL *p, DBL *q, double c, CDB s) {
     const L x = L::load(p), y = L::load(q), turn = NegativeFirst<L>(s.im);
-    (L(c) * x + (L(s.re) * y + turn * Exchanged(y))).store(p);
-    (L(c) * y - (L(s.re) * x - turn * Exchanged(x))).store(q);
+    (L(c) * x + (L(s.re) * y + turn * Swapped(y))).store(p);
+    (L(c) * y - (L(s.re) * x - turn * Swapped(x))).store(q);
 }
 
 void RotateComplexRows(CDB *p, CDB *q, int32_t width, double c, CDB s) {

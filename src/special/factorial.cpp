@@ -1,5 +1,6 @@
 #include "special/factorial.h"
 
+#include "frame/arithmetic.h"
 #include "frame/constants.h"
 #include "special/extended.h"
 #include "special/gamma.h"
@@ -56,6 +57,7 @@ constexpr double kRestOfLast = 5.568025205059617e+20;
 
 // A look-up is a fifth of the time of gamma.
 std::array<double, kLastFinite + 1> AllFinite() {
+    const DefaultArithmetic arithmetic; // whatever modes the process has then
     std::array<double, kLastFinite + 1> values;
     Extended product = {kTable[kLastInTable], kRestOfLast};
     for (int32_t n = 0; n <= kLastFinite; ++n) {

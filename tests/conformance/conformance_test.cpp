@@ -5,6 +5,7 @@
 #include "tests/fuzz/oddities.h"
 #include "tests/support/code_list.h"
 #include "tests/support/heap_probe.h"
+#include "tests/support/host_arithmetic.h"
 #include "tests/support/recipe.h"
 
 #include <gtest/gtest.h>
@@ -384,6 +385,25 @@ TEST(Hashes, AreThoseThatWereAccepted) {
         changed += "\n" + gone.first + " is gone";
     EXPECT_EQ(changed, "")
         << "If that is meant: tools/compare_hashes --accept, and commit " QX_HASHES;
+}
+
+// Whatever modes the host has set when it calls, and it has them again afterwards.
+TEST(Hashes, AreTheSameInEveryArithmeticOfTheHost) {
+    const std::map<std::string, uint64_t> expected = HashEveryExport();
+    for (const NamedModes &host : modesOfHosts) {
+        std::string changed;
+        const auto found = HashEveryExport([&](const Recipe &recipe, Call &call) {
+            const InArithmetic hosts(host.modes);
+            const int32_t result = recipe.run(call);
+            if (CurrentArithmetic() != host.modes)
+                changed += "\n" + recipe.name + " leaves other modes";
+            return result;
+        });
+        for (const auto &[name, hash] : expected)
+            if (found.at(name) != hash)
+                changed += "\n" + name + " gives other bits";
+        EXPECT_EQ(changed, "") << host.name;
+    }
 }
 
 TEST(Catalogue, EveryExportHasARecipe) {

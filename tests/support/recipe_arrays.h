@@ -2,6 +2,7 @@
 #define QX_TESTS_RECIPE_ARRAYS_H
 
 #include "tests/support/heap_probe.h"
+#include "tests/support/host_arithmetic.h"
 
 #include <algorithm>
 #include <type_traits>
@@ -35,6 +36,7 @@ auto ValueAt(const Values &values, int32_t index, int32_t cols) {
 
 template <class T, class Values>
 void Fill(T *elements, int32_t count, int32_t cols, int seed, const Values &values) {
+    const InArithmetic usual(usualArithmetic);
     constexpr bool isComplex = requires { elements->re; };
     constexpr bool isNoise = std::is_same_v<Values, FromNoise>;
     Noise noise(static_cast<uint64_t>(seed));

@@ -10,7 +10,7 @@ that was published with this version. It takes some seconds. The status is 0 whe
 
 examples:
   python3 -m qx verify
-  QX_WIDTH=2 python3 -m qx verify      # as on a processor without AVX2"""
+  QX_WIDTH=2 python3 -m qx verify      # as on a processor without AVX2 (4: without AVX-512)"""
 
 PROGRAM, PUBLISHED = "print_hashes", "hashes.txt"
 

@@ -214,6 +214,9 @@ ErrorCode TransformUnreserveProc(InstanceWord *instance) {
     return qx::TransformInstanceRelease(instance);
 }
 
-FFTPlan *create_oxfft_table(int32_t length) { return qx::create_oxfft_table(length); }
+FFTPlan *create_oxfft_table(int32_t length) {
+    const qx::DefaultArithmetic arithmetic;
+    return qx::create_oxfft_table(length);
+}
 
 void destroy_oxfft_table(FFTPlan *plan) { qx::destroy_oxfft_table(plan); }

@@ -10,7 +10,7 @@
 namespace qx {
 
 // x becomes c x + s y and y becomes c y - s x, element by element.
-QX_BY_WIDTH(void, RotateReal, (std::ptrdiff_t n, DBL *x, DBL *y, double c, double s))
+QX_BY_WIDTH_TO_8(void, RotateReal, (std::ptrdiff_t n, DBL *x, DBL *y, double c, double s))
 
 } // namespace qx
 

@@ -37,12 +37,12 @@ struct ComplexFactor {
 //
 // Large products copy blocks of both operands into pages that are kept for the next caller
 // (products/panel_memory.h). Without such memory they are slower and give the same bits.
-QX_BY_WIDTH(void, AddProductReal,
-            (std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, RealFactor factor, RealOperand a,
-             RealOperand b, DBL *c, std::ptrdiff_t cStride))
-QX_BY_WIDTH(void, AddProductComplex,
-            (std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, ComplexFactor factor,
-             ComplexOperand a, ComplexOperand b, CDB *c, std::ptrdiff_t cStride))
+QX_BY_WIDTH_TO_8(void, AddProductReal,
+                 (std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, RealFactor factor,
+                  RealOperand a, RealOperand b, DBL *c, std::ptrdiff_t cStride))
+QX_BY_WIDTH_TO_8(void, AddProductComplex,
+                 (std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, ComplexFactor factor,
+                  ComplexOperand a, ComplexOperand b, CDB *c, std::ptrdiff_t cStride))
 
 } // namespace qx
 

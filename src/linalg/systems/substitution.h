@@ -28,12 +28,12 @@ ErrorCode Substitute(Factors factors, ConstVectorView<E> a, const MatrixView<E> 
 // The same with memory for the strips of columns that pass through the substitution together: n
 // times `stripWidth` doubles, or none for a single right side.
 inline constexpr int32_t stripWidth = 32;
-QX_BY_WIDTH(void, SubstituteStrips,
-            (Factors factors, const DBL *a, std::ptrdiff_t n, std::ptrdiff_t rightSides, DBL *x,
-             DBL *strip))
-QX_BY_WIDTH(void, CxSubstituteStrips,
-            (Factors factors, const CDB *a, std::ptrdiff_t n, std::ptrdiff_t rightSides, CDB *x,
-             DBL *strip))
+QX_BY_WIDTH_TO_8(void, SubstituteStrips,
+                 (Factors factors, const DBL *a, std::ptrdiff_t n, std::ptrdiff_t rightSides,
+                  DBL *x, DBL *strip))
+QX_BY_WIDTH_TO_8(void, CxSubstituteStrips,
+                 (Factors factors, const CDB *a, std::ptrdiff_t n, std::ptrdiff_t rightSides,
+                  CDB *x, DBL *strip))
 
 } // namespace qx
 

@@ -49,14 +49,8 @@ struct RealRow {
             v[i] = v[i] / L(a);
     }
     static double conjugate(const T &a) { return a; }
-    static void gather(const T *x, DBL *row) {
-        for (std::ptrdiff_t j = 0; j < columns; ++j)
-            row[j] = x[j];
-    }
-    static void scatter(const DBL *row, T *x) {
-        for (std::ptrdiff_t j = 0; j < columns; ++j)
-            x[j] = row[j];
-    }
+    static void gather(const T *x, DBL *row) { load(x).store(row); }
+    static void scatter(const DBL *row, T *x) { load(row).store(x); }
 };
 
 template <class L, int Vectors>
@@ -249,11 +243,11 @@ void SolveAll(Factors factors, const T *a, std::ptrdiff_t n, std::ptrdiff_t righ
 
 void SubstituteStrips(Factors factors, const DBL *a, std::ptrdiff_t n, std::ptrdiff_t rightSides,
                       DBL *x, DBL *strip) {
-    SolveAll<RealRow, 8>(factors, a, n, rightSides, x, strip);
+    SolveAll<RealRow, nativeLanes == 8 ? 4 : 8>(factors, a, n, rightSides, x, strip);
 }
 void CxSubstituteStrips(Factors factors, const CDB *a, std::ptrdiff_t n, std::ptrdiff_t rightSides,
                         CDB *x, DBL *strip) {
-    SolveAll<ComplexRow, 4>(factors, a, n, rightSides, x, strip);
+    SolveAll<ComplexRow, nativeLanes == 8 ? 2 : 4>(factors, a, n, rightSides, x, strip);
 }
 
 } // namespace qx::QX_WIDTH

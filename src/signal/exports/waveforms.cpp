@@ -201,12 +201,14 @@ ErrorCode PeriodicSincH(DBL1D x, int32_t n, double amp, int32_t order, double dt
 
 int32_t PhasMod(int32_t n, double dt, double *phaseOut, double fc, DBL *y, double *peak,
                 double *phase) {
+    const qx::DefaultArithmetic arithmetic;
     *phaseOut = qx::ModulatePhase(dt, fc, qx::Given(y, n), *peak, *phase);
     return 0;
 }
 
 int32_t FreqMod(int32_t n, double dt, double *phaseOut, double fc, DBL *y, double *peak,
                 double *phase) {
+    const qx::DefaultArithmetic arithmetic;
     *phaseOut = qx::ModulateFrequency(dt, fc, qx::Given(y, n), *peak, *phase);
     return 0;
 }
