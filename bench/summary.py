@@ -8,6 +8,8 @@ from pathlib import Path
 
 
 def width():
+    if os.uname().machine == "aarch64":
+        return "NEON"
     wide = "avx2" in Path("/proc/cpuinfo").read_text().split() and os.environ.get("QX_WIDTH") != "2"
     return "AVX2" if wide else "SSE2"
 

@@ -4,6 +4,10 @@
 #include <cstring>
 
 namespace qx {
+
+int32_t lanesInUse = 2;
+
+#ifdef QX_HAS_AVX2_BUILD
 namespace {
 
 bool BaselineIsForced() {
@@ -13,13 +17,12 @@ bool BaselineIsForced() {
 
 } // namespace
 
-int32_t lanesInUse = 2;
-
 // Looks at the processor and at which registers the operating system saves.
 __attribute__((constructor(101))) static void ChooseWidth() {
     __builtin_cpu_init();
     if (__builtin_cpu_supports("avx2") && !BaselineIsForced())
         lanesInUse = 4;
 }
+#endif
 
 } // namespace qx

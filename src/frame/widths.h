@@ -32,8 +32,11 @@ namespace qx {
 
 // The lanes of the routines that are called, 2 or 4: the most that processor and operating system
 // offer. QX_WIDTH=2 in the environment forces the smaller one. It is found when the module is
-// loaded, ahead of static initialisers; whoever comes still earlier meets 2.
+// loaded, ahead of static initialisers; whoever comes still earlier meets 2. ARM has 2 alone.
 extern int32_t lanesInUse;
+
+#if defined(__x86_64__) || defined(__i386__)
+#define QX_HAS_AVX2_BUILD 1
 
 template <auto Baseline, auto Avx2>
 struct ByWidth;
@@ -45,8 +48,6 @@ struct ByWidth<Baseline, Avx2> {
     }
 };
 
-} // namespace qx
-
 #define QX_BY_WIDTH(result, name, parameters)                                                      \
     namespace baseline {                                                                           \
     result name parameters;                                                                        \
@@ -55,5 +56,26 @@ struct ByWidth<Baseline, Avx2> {
     result name parameters;                                                                        \
     }                                                                                              \
     constexpr ByWidth<baseline::name, avx2::name> name{};
+
+#else
+
+template <auto Baseline>
+struct OfOneWidth;
+template <class Result, class... Arguments, Result (*Baseline)(Arguments...)>
+struct OfOneWidth<Baseline> {
+    __attribute__((always_inline)) Result operator()(Arguments... arguments) const {
+        return Baseline(arguments...);
+    }
+};
+
+#define QX_BY_WIDTH(result, name, parameters)                                                      \
+    namespace baseline {                                                                           \
+    result name parameters;                                                                        \
+    }                                                                                              \
+    constexpr OfOneWidth<baseline::name> name{};
+
+#endif
+
+} // namespace qx
 
 #endif
