@@ -48,7 +48,9 @@ __attribute__((always_inline)) inline void MultiplyAndAdd(int64_t products) {
 #ifdef QX_HAS_AVX2_BUILD
 __attribute__((target("avx2")))
 #endif
-void MultiplyAndAddWide(int64_t products) { MultiplyAndAdd<32>(products); }
+void MultiplyAndAddWide(int64_t products) {
+    MultiplyAndAdd<32>(products);
+}
 
 void DirectAgainstTheMachine() {
     Ratios ratios("direct convolution, 64 taps and more");

@@ -76,8 +76,8 @@ class Windows:
 
     def test_first_programs(self):
         for compiler, source in (("gcc -std=c11", "first_call.c"), ("g++ -std=c++20 -static", "first_call.cpp")):
-            run("sh", "-c", f"{self.processor}-w64-mingw32-{compiler} -Iinclude examples/{source} lib/qxanalysis.lib lib/qxrt.lib"
-                " -o first_call.exe", cwd=self.place)
+            run("sh", "-c", f"{self.processor}-w64-mingw32-{compiler} -Iinclude examples/{source}"
+                " lib/qxanalysis.lib lib/qxrt.lib -o first_call.exe", cwd=self.place)
             self.assertRegex(self.in_wine("first_call.exe").stdout, r"mean +5(?s:.*)ErrOrderNotPositive")
 
     def test_import_libraries_of_visual_cpp(self):
@@ -85,7 +85,8 @@ class Windows:
             if not shutil.which(tool):
                 self.skipTest(f"{tool} is not installed")
         (self.place / "start.c").write_text(WITHOUT_RUN_TIME, "utf-8")
-        run("clang", f"--target={self.processor}-pc-windows-msvc", "-ffreestanding", "-Iinclude", "-c", "start.c", cwd=self.place)
+        run("clang", f"--target={self.processor}-pc-windows-msvc", "-ffreestanding", "-Iinclude", "-c", "start.c",
+            cwd=self.place)
         run("lld-link", "/subsystem:console", "/entry:start", "/nodefaultlib", *self.options, "start.o",
             "lib/qxanalysis.lib", "lib/qxrt.lib", "/out:start.exe", cwd=self.place)
         self.assertEqual(self.in_wine("start.exe").returncode, 42)
