@@ -38,14 +38,17 @@ __attribute__((always_inline)) inline void MultiplyAndAdd(int64_t products) {
 #pragma GCC unroll 12
         for (Vector &sum : sums) {
             Vector value = factor;
-            asm volatile("" : "+x"(value));
+            asm volatile("" : "+" QX_VECTOR_REGISTER(value));
             sum = sum + value * factor;
         }
     }
     for (Vector &sum : sums)
-        asm volatile("" : : "x"(sum));
+        asm volatile("" : : QX_VECTOR_REGISTER(sum));
 }
-__attribute__((target("avx2"))) void MultiplyAndAddWide(int64_t products) {
+#ifdef QX_HAS_AVX2_BUILD
+__attribute__((target("avx2")))
+#endif
+void MultiplyAndAddWide(int64_t products) {
     MultiplyAndAdd<32>(products);
 }
 

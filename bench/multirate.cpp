@@ -201,7 +201,7 @@ void Rates() {
 void Chain(int32_t n, double term) {
     double sum = 0;
     for (int32_t i = 0; i < n; ++i) {
-        asm volatile("" : "+x"(term));
+        asm volatile("" : "+" QX_VECTOR_REGISTER(term));
         sum = sum + term - 0.5;
     }
     Keep(sum);

@@ -35,7 +35,7 @@ void SineChain(double k) {
 void AdditionChain(double step) {
     double sum = 0.0;
     for (int32_t i = 0; i < n; ++i) {
-        asm volatile("" : "+x"(step));
+        asm volatile("" : "+" QX_VECTOR_REGISTER(step));
         sum += step;
     }
     Keep(sum);

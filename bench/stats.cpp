@@ -134,7 +134,7 @@ void Median() {
 void AdditionChain(int32_t n, double term) {
     double sum = 0.0;
     for (int32_t i = 0; i < n; ++i) {
-        asm volatile("" : "+x"(term));
+        asm volatile("" : "+" QX_VECTOR_REGISTER(term));
         sum += term;
     }
     Keep(sum);

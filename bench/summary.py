@@ -8,6 +8,8 @@ from pathlib import Path
 
 
 def width():
+    if os.uname().machine == "aarch64":
+        return "NEON"
     flags, most = Path("/proc/cpuinfo").read_text().split(), os.environ.get("QX_WIDTH")
     if most not in ("2", "4") and {"avx512f", "avx512dq", "avx512bw", "avx512vl"} <= set(flags):
         return "AVX-512"

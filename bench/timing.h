@@ -1,7 +1,7 @@
 #ifndef QX_BENCH_TIMING_H
 #define QX_BENCH_TIMING_H
 
-#include "frame/widths.h"
+#include "frame/lanes.h"
 
 #include <algorithm>
 #include <array>
@@ -80,9 +80,13 @@ std::array<double, sizeof...(Work)> LeastTimes(const Work &...contestants) {
     return least;
 }
 
+#ifdef QX_HAS_AVX2_BUILD
 inline const char *WidthInUse() {
     return lanesInUse == 8 ? "AVX-512" : lanesInUse == 4 ? "AVX2" : "SSE2";
 }
+#else
+inline const char *WidthInUse() { return "NEON"; }
+#endif
 
 #ifdef __clang__
 inline constexpr char compiler[] = "clang++ " __clang_version__;

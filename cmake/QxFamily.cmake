@@ -33,7 +33,7 @@ function(qx_family)
     list(TRANSFORM F_EXPORTS PREPEND ${CMAKE_CURRENT_SOURCE_DIR}/)
     list(TRANSFORM F_RECIPES PREPEND ${CMAKE_CURRENT_SOURCE_DIR}/)
     target_sources(qxcore PRIVATE ${F_CORE} ${F_LANES})
-    if(F_LANES)
+    if(F_LANES AND QX_AVX2)
         qx_compile_for_avx2(${family} ${F_LANES})
     endif()
     if(F_WIDE_LANES AND QX_EIGHT_LANES)
@@ -74,12 +74,18 @@ endfunction()
 # Inline functions and instances of templates stay local (g++: -fno-weak, which warns of constants
 # that become several; the baseline build tells the warnings that count), so that the linker cannot
 # choose one of these for the baseline; tests/widths_test.py looks at the objects.
+#
+# On 64-bit Windows g++ aligns the stack to 16 bytes and takes it for aligned to 32: the assembler makes
+# of every aligned move one that needs no alignment.
 function(qx_compile_for_width family width options)
     set(objects ${family}_${width})
     add_library(${objects} OBJECT ${ARGN})
     target_compile_definitions(${objects} PRIVATE QX_WIDTH=${width})
     target_compile_options(${objects} PRIVATE ${options}
         $<$<CXX_COMPILER_ID:GNU>:-fno-weak> $<$<CXX_COMPILER_ID:GNU>:-w>)
+    if(WIN32 AND CMAKE_SIZEOF_VOID_P EQUAL 8)
+        target_compile_options(${objects} PRIVATE -Wa,-muse-unaligned-vector-move)
+    endif()
     target_include_directories(${objects} PRIVATE ${PROJECT_SOURCE_DIR}/src ${PROJECT_SOURCE_DIR}/include)
     target_link_libraries(${objects} PRIVATE qxflags)
     target_sources(qxcore PRIVATE $<TARGET_OBJECTS:${objects}>)
@@ -112,9 +118,19 @@ function(qx_run_as_test name)
     set_tests_properties(${name} PROPERTIES SKIP_RETURN_CODE 77)
 endfunction()
 
-# The program once more as on a processor of at most that many lanes. Where the processor has no more than 4
-# itself, its plain run is that at 4, and the tests of the widths say what was left out.
+# The program once more as on a processor of at most that many lanes: 2, or 4 where the processor has more.
+# The sanitizers run at the smallest and the largest width.
+set(QX_WIDEST 4)
+if(QX_EIGHT_LANES AND EXISTS /proc/cpuinfo)
+    file(STRINGS /proc/cpuinfo wide REGEX "avx512f.*avx512dq.*avx512bw.*avx512vl" LIMIT_COUNT 1)
+    if(wide)
+        set(QX_WIDEST 8)
+    endif()
+endif()
 function(qx_run_at_width name lanes)
+    if(NOT QX_AVX2 OR NOT lanes LESS QX_WIDEST OR (QX_SANITIZE AND lanes GREATER 2))
+        return()
+    endif()
     add_test(NAME ${name}_width${lanes} COMMAND ${name} --gtest_brief=1)
     set_tests_properties(${name}_width${lanes} PROPERTIES SKIP_RETURN_CODE 77 ENVIRONMENT QX_WIDTH=${lanes})
 endfunction()

@@ -13,6 +13,13 @@ foreach(function IN ITEMS sin cos tan asin acos atan atan2 sinh cosh tanh exp ex
     target_compile_options(qxflags INTERFACE -fno-builtin-${function})
 endforeach()
 
+# Processors for which routines over lanes are compiled a second time, for AVX2. ARM has one width.
+if(CMAKE_SYSTEM_PROCESSOR MATCHES "^(x86_64|AMD64|i[3-6]86)$")
+    set(QX_AVX2 ON)
+else()
+    set(QX_AVX2 OFF)
+endif()
+
 if(CMAKE_SIZEOF_VOID_P EQUAL 4)
     target_compile_options(qxflags INTERFACE -msse2 -mfpmath=sse -mstackrealign)
 endif()

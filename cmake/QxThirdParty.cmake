@@ -1,13 +1,16 @@
 # The libraries that the module carries: the mathematics library, and LAPACK with its BLAS. ./setup builds them
 # from pinned sources with one compiler and one set of flags for every configuration of a target, so
 # that every export gives the same bits in all of them; here they are only looked for.
-if(WIN32)
-    set(QX_SETUP_TARGET i686-mingw)
-    set(setup "./setup win32")
-else()
+if(NOT DEFINED QX_SETUP_TARGET) # which the files for other targets set
     set(QX_SETUP_TARGET linux)
-    set(setup "./setup")
 endif()
+set(setup ./setup)
+foreach(pair IN ITEMS "i686-mingw win32" "x86_64-mingw win64" "arm64 arm64")
+    string(REGEX MATCH "(.*) (.*)" pair ${pair})
+    if(CMAKE_MATCH_1 STREQUAL QX_SETUP_TARGET)
+        set(setup "./setup ${CMAKE_MATCH_2}")
+    endif()
+endforeach()
 # What is looked for depends on all of these.
 file(GLOB recipes CONFIGURE_DEPENDS ${PROJECT_SOURCE_DIR}/tools/setup/*
     ${PROJECT_SOURCE_DIR}/tools/setup/patches/*/*.patch ${PROJECT_SOURCE_DIR}/src/mathlib/*.c ${PROJECT_SOURCE_DIR}/src/mathlib/pair.h)
@@ -45,6 +48,7 @@ endforeach()
 configure_file(${PROJECT_SOURCE_DIR}/NOTICE.md ${QX_LICENCES}/NOTICE.md COPYONLY)
 if(WIN32)
     configure_file(/usr/share/doc/gcc-mingw-w64-base/copyright ${QX_LICENCES}/windows-gcc-copyright COPYONLY)
-    configure_file(/usr/share/doc/mingw-w64-i686-dev/copyright
+    string(REPLACE _ - processor ${CMAKE_SYSTEM_PROCESSOR})
+    configure_file(/usr/share/doc/mingw-w64-${processor}-dev/copyright
         ${QX_LICENCES}/windows-mingw-w64-copyright COPYONLY)
 endif()

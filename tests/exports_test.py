@@ -7,10 +7,13 @@ import subprocess
 import sys
 import unittest
 
-LIBRARY, CATALOGUE = sys.argv.pop(1), sys.argv.pop(1)
+LIBRARY, CATALOGUE, NM, OBJDUMP, READELF = (sys.argv.pop(1) for _ in range(5))
 ON_WINDOWS = LIBRARY.endswith(".dll")
 MATHEMATICS = """sin cos sincos tan asin acos atan atan2 sinh cosh tanh exp exp2 expm1 log log2
-    log10 log1p pow cbrt hypot fmod floor ceil trunc round rint tgamma lgamma erf erfc""".split()
+    log10 log1p pow cbrt hypot fmod floor ceil trunc round rint tgamma lgamma erf erfc
+    __powidf2 __muldc3 __divdc3 __multf3 __divtf3""".split()
+# A product and a sum with one rounding, of x86 and of ARM, by the names of the disassembler.
+FUSED = re.compile(r"^ +[0-9a-f]+:\t(vfn?m(?:add|sub)\w*|fn?m(?:add|sub)|fml[as]\w*|fcmla)\s", re.MULTILINE)
 
 
 def output(*command):
@@ -20,7 +23,7 @@ def output(*command):
 def windows_tables():
     """Exported names, and imported names by DLL."""
     exports, imports, table, dll = set(), {}, None, None
-    for line in output("i686-w64-mingw32-objdump", "-p", LIBRARY).splitlines():
+    for line in output(OBJDUMP, "-p", LIBRARY).splitlines():
         if line.startswith("[Ordinal/Name Pointer] Table"):
             table = exports
         elif line.strip().startswith("DLL Name:"):
@@ -40,11 +43,11 @@ class Boundary(unittest.TestCase):
             self.libraries = sorted(name.lower() for name in by_dll)
             self.taken = set().union(*by_dll.values())
         else:
-            names = output("nm", "-D", LIBRARY).splitlines()
+            names = output(NM, "-D", LIBRARY).splitlines()
             fields = [line.split() for line in names]
             self.shown = {f[-1].split("@")[0] for f in fields if f[-2] not in "Uwv"}
             self.taken = {f[-1].split("@")[0] for f in fields if f[-2] in "Uwv"}
-            dynamic = output("readelf", "-dW", LIBRARY)
+            dynamic = output(READELF, "-dW", LIBRARY)
             self.libraries = re.findall(r"\(NEEDED\).*\[(.*)\]", dynamic)
 
     def test_shows_exactly_the_declared_exports(self):
@@ -57,6 +60,19 @@ class Boundary(unittest.TestCase):
         """Their last bits would differ from machine to machine."""
         self.assertTrue(self.taken)
         self.assertEqual(sorted(self.taken & set(MATHEMATICS)), [])
+
+    def test_fuses_no_product_with_a_sum(self):
+        """Bits would depend on the compiler, and a processor may have no such instruction. What has been
+        linked into the module counts as well."""
+        code = output(OBJDUMP, "-d", "--no-show-raw-insn", LIBRARY)
+        self.assertGreater(len(re.findall(r"\tv?(?:mulpd|fmul)\s", code)), 100, "not disassembled")
+        self.assertEqual(sorted(set(FUSED.findall(code))), [])
+
+    def test_knows_fused_instructions(self):
+        for line in ("  40:\tfmadd\td0, d1, d2, d3", "  40:\tfnmsub\td0, d1, d2, d3", "  4:\tfmla\tv0.2d, v1.2d, v2.2d",
+                     " 400:\tvfmadd213sd %xmm0,%xmm1,%xmm2", " 400:\tvfnmsub231pd (%rax),%ymm1,%ymm2"):
+            self.assertTrue(FUSED.search(line), line)
+        self.assertFalse(FUSED.search("  40:\tfmul\tv0.2d, v1.2d, v2.2d\n  44:\tfmov\td0, d1\n"))
 
     @unittest.skipUnless(ON_WINDOWS, "the run-times are linked in on Windows")
     def test_needs_only_the_system(self):

@@ -3,6 +3,7 @@
     package_test.py SOURCE [TEST...]
 """
 
+import functools
 import os
 import re
 import shutil
@@ -47,17 +48,23 @@ int start(void) {
 """
 
 
-@unittest.skipUnless(ALL, "builds for Windows: ./test --all")
-class Windows(InAFolder):
+@functools.cache
+def make_windows_packages():
+    run(SOURCE / "tools/package", "windows")
+
+
+class Windows:
+    """The zip and the wheel for one of the two."""
+
     @classmethod
     def setUpClass(cls):
         if not shutil.which("llvm-dlltool"):
             raise unittest.SkipTest("llvm is not installed")
-        run(SOURCE / "tools/package", "windows")
+        make_windows_packages()
 
     def setUp(self):
         super().setUp()
-        with zipfile.ZipFile(next(PACKAGES.glob("*-win32.zip"))) as archive:
+        with zipfile.ZipFile(next(PACKAGES.glob(f"*-{self.platform}.zip"))) as archive:
             archive.extractall(self.folder)
         self.place = next(self.folder.iterdir())
 
@@ -69,8 +76,8 @@ class Windows(InAFolder):
 
     def test_first_programs(self):
         for compiler, source in (("gcc -std=c11", "first_call.c"), ("g++ -std=c++20 -static", "first_call.cpp")):
-            run("sh", "-c", f"i686-w64-mingw32-{compiler} -Iinclude examples/{source} lib/qxanalysis.lib lib/qxrt.lib"
-                " -o first_call.exe", cwd=self.place)
+            run("sh", "-c", f"{self.processor}-w64-mingw32-{compiler} -Iinclude examples/{source}"
+                " lib/qxanalysis.lib lib/qxrt.lib -o first_call.exe", cwd=self.place)
             self.assertRegex(self.in_wine("first_call.exe").stdout, r"mean +5(?s:.*)ErrOrderNotPositive")
 
     def test_import_libraries_of_visual_cpp(self):
@@ -78,16 +85,27 @@ class Windows(InAFolder):
             if not shutil.which(tool):
                 self.skipTest(f"{tool} is not installed")
         (self.place / "start.c").write_text(WITHOUT_RUN_TIME, "utf-8")
-        run("clang", "--target=i686-pc-windows-msvc", "-ffreestanding", "-Iinclude", "-c", "start.c", cwd=self.place)
-        run("lld-link", "/subsystem:console", "/entry:start", "/nodefaultlib", "/safeseh:no", "start.o",
+        run("clang", f"--target={self.processor}-pc-windows-msvc", "-ffreestanding", "-Iinclude", "-c", "start.c",
+            cwd=self.place)
+        run("lld-link", "/subsystem:console", "/entry:start", "/nodefaultlib", *self.options, "start.o",
             "lib/qxanalysis.lib", "lib/qxrt.lib", "/out:start.exe", cwd=self.place)
         self.assertEqual(self.in_wine("start.exe").returncode, 42)
 
     def test_wheel_has_the_libraries(self):
-        with zipfile.ZipFile(next(PACKAGES.glob("*-py3-none-win32.whl"))) as wheel:
+        with zipfile.ZipFile(next(PACKAGES.glob(f"*-py3-none-{self.platform}.whl"))) as wheel:
             names = set(wheel.namelist())
         self.assertLessEqual({"qx/qxanalysis.dll", "qx/qxrt.dll", "qx/catalogue.json", "qx/exports.pyi"}, names)
         self.assertFalse([name for name in names if name.endswith(".so")])
+
+
+@unittest.skipUnless(ALL, "builds for Windows: ./test --all")
+class Windows32(Windows, InAFolder):
+    platform, processor, options = "win32", "i686", ["/safeseh:no"]
+
+
+@unittest.skipUnless(ALL, "builds for Windows: ./test --all")
+class Windows64(Windows, InAFolder):
+    platform, processor, options = "win_amd64", "x86_64", []
 
 
 THROWS = """

@@ -3,7 +3,7 @@
     readme_test.py SOURCE BUILD            on this machine, with the libraries of BUILD
     readme_test.py SOURCE BUILD --bare     on a Debian with nothing installed (tools/setup/bare-root):
                                            what ./run installs there must do for all that follows
-    readme_test.py SOURCE BUILD --windows  the commands for 32-bit Windows, with the build of win32
+    readme_test.py SOURCE BUILD --windows  the commands for 64-bit Windows, with the build of win64
 
 All indented lines of the README and its blocks in C and Python are run, but for those named here with
 a reason. Exit code 77 says that nothing has run.
@@ -32,7 +32,7 @@ SHORTENED = {
     # It measures for minutes: a first row is enough.
     "bench/run fft": "(bench/run fft || true) | grep -m 1 ' complex '",
     # The build that is taken was configured so.
-    "cmake --preset win32": "[ -f build/win32/build.ninja ]",
+    "cmake --preset win64": "[ -f build/win64/build.ninja ]",
 }
 
 # What the placeholders of the README stand for.
@@ -69,7 +69,7 @@ AFTERWARDS = {
     "cmake --install": "[ -f ~/qx-library/include/qx/qx.h ]",
     "cc first.c": "(cd / && \"$OLDPWD/first\" | grep '^2.33333 (')",
     "tools/site": "[ -s build/site/index.html ]",
-    "cp build/win32": "tools/wine-run first.exe | grep '^2.33333 ('",
+    "cp build/win64": "tools/wine-run first.exe | grep '^2.33333 ('",
 }
 
 
@@ -101,7 +101,7 @@ def script(readme, windows):
     prepared = False
     for line in commands(readme):
         shown = line.split("\n")[0]
-        of_windows = bool(re.search(r"win32|mingw", line))
+        of_windows = bool(re.search(r"win64|mingw", line))
         if line in LEFT_OUT or (of_windows != windows and not shown.startswith("cat >first.c")):
             continue
         if not prepared and shown.startswith("./run m"):
@@ -140,14 +140,14 @@ def machine_cache(source):
 
 
 def on_this_machine(source, build, windows):
-    if windows and subprocess.run([source / "tools/setup/wine"], stdout=subprocess.DEVNULL).returncode:
+    if windows and subprocess.run([source / "tools/setup/wine", "64"], stdout=subprocess.DEVNULL).returncode:
         return skipped("there is no Wine here")
     with tempfile.TemporaryDirectory() as name:
         copy = Path(name) / "qxanalysis"
         copy.mkdir()
         copied(source, copy)
         (copy / "build").mkdir()
-        (copy / "build" / ("win32" if windows else "release")).symlink_to(build)
+        (copy / "build" / ("win64" if windows else "release")).symlink_to(build)
         environment = {**os.environ, "HOME": name, "PATH": DEBIAN_PATH,
                        "QX_CACHE": str(machine_cache(source))}
         for variable in ("PYTHONPATH", "QX_LIBRARY_DIR"):

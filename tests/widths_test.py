@@ -2,7 +2,9 @@
 """widths_test.py NM OBJDUMP MODULE --baseline OBJECT... --avx2 OBJECT... --avx512 OBJECT...: the objects
 of a wider build define no function that the linker could take for another build of the same function: every
 global or weak one has its width in its name. No object has an instruction above its width, and the module
-none that fuses a multiplication with an addition. Without OBJDUMP (a dash) only names are looked at."""
+none that fuses a multiplication with an addition. On 64-bit Windows, where the stack is aligned to 16 bytes
+only, no object expects a better alignment of a vector of 32. Without OBJDUMP (a dash) only names are looked
+at."""
 
 import re
 import subprocess
@@ -13,6 +15,7 @@ NM = OBJDUMP = MODULE = None
 OBJECTS = {}
 # The namespaces, as names are mangled.
 NAMES = {"avx2": ("4avx2", "6lanes4"), "avx512": ("6avx512", "6lanes8")}
+ALIGNED = re.compile(r"^vmov(?:ap[sd]|dqa|ntp[sd]|ntdqa?)\s+(?=.*\().*%ymm")
 PLACED_BY_LINKER = set("TWi")  # functions that are global, weak or chosen at run time
 FUSED = re.compile(r"^v?f?n?m(add|sub|addsub|subadd)[1-3]*[ps][sdh]$|^vf(n?m(add|sub)|maddsub|msubadd)|^vfc?maddc")
 # Of a line of a disassembly: what only a wider processor has.
@@ -86,6 +89,20 @@ class Widths(unittest.TestCase):
         self.assertTrue(ABOVE["avx2"].search("vaddpd %ymm17,%ymm0,%ymm2"))
         self.assertTrue(ABOVE["avx2"].search("vaddpd (%rax),%ymm0,%ymm2{%k1}"))
         self.assertTrue(X87.search("fldl 0x8(%rsp)"))
+
+    def test_expect_no_alignment_that_64_bit_windows_does_not_give(self):
+        if OBJDUMP == "-":
+            self.skipTest("names only")
+        for path in OBJECTS["avx2"]:
+            head = subprocess.run([OBJDUMP, "-f", path], check=True, capture_output=True, text=True).stdout
+            if "pe-x86-64" not in head:
+                self.skipTest("not for 64-bit Windows")
+            self.assertEqual(found(ALIGNED, instructions(path)), [], path)
+
+    def test_know_an_aligned_move(self):
+        self.assertTrue(ALIGNED.search("vmovapd %ymm6,0x20(%rsp)"))
+        self.assertFalse(ALIGNED.search("vmovapd %ymm6,%ymm7"))
+        self.assertFalse(ALIGNED.search("vmovupd %ymm6,0x20(%rsp)"))
 
 
 def lists(words):

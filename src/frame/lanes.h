@@ -7,6 +7,15 @@
 #include <cstddef>
 #include <cstdint>
 
+#ifdef __aarch64__
+#include <arm_neon.h>
+#define QX_VECTOR_REGISTER "w"
+#else
+#define QX_VECTOR_REGISTER "x"
+#endif
+
+// QX_VECTOR_REGISTER is the constraint of assembly for a register of lanes.
+
 // Operations become part of the loop that uses them, at every level of optimisation.
 #define QX_INLINE __attribute__((always_inline)) inline
 
@@ -381,6 +390,12 @@ QX_INLINE void Transpose(Lanes<N> *block) {
     }
 }
 
+// Makes the compiler read x once into a register, not once per use.
+template <int N>
+QX_INLINE void KeepInRegister(Lanes<N> &x) {
+    asm("" : "+" QX_VECTOR_REGISTER(x.v));
+}
+
 // One value from each of N places.
 template <int N>
 QX_INLINE Lanes<N> LoadEach(const DBL *const *from, std::ptrdiff_t at) {
@@ -397,7 +412,13 @@ QX_INLINE Lanes<N> LoadEach(const DBL *const *from, std::ptrdiff_t at) {
 
 // The sign bits of the lanes, that of lane 0 lowest.
 QX_INLINE unsigned SignBits(Lanes<2> x) {
+#ifdef __SSE2__
     return static_cast<unsigned>(__builtin_ia32_movmskpd(x.v));
+#else
+    typedef uint64_t Bits __attribute__((vector_size(16)));
+    const Bits signs = (Bits)x.v >> 63;
+    return static_cast<unsigned>(signs[0] | signs[1] << 1);
+#endif
 }
 QX_INLINE unsigned SignBits(Lanes<4> x) {
 #ifdef __AVX2__
@@ -418,11 +439,15 @@ QX_INLINE unsigned SignBits(Lanes<8> x) {
 }
 
 // The products of the lower halves of each 64 bits as unsigned integers. clang++ makes one
-// instruction of the plain text, g++ three multiplications.
+// instruction of the plain text, g++ three multiplications; ARM has none for lanes of 64 bits.
 template <int N>
 QX_INLINE typename LaneInteger<N>::type LowerProducts(typename LaneInteger<N>::type a,
                                                       typename LaneInteger<N>::type b) {
-#ifndef __clang__
+#if defined(__aarch64__)
+    if constexpr (N == 2)
+        return (typename LaneInteger<N>::type)vmull_u32(vmovn_u64((uint64x2_t)a),
+                                                        vmovn_u64((uint64x2_t)b));
+#elif !defined(__clang__)
     typedef int FourHalves __attribute__((vector_size(16)));
     if constexpr (N == 2)
         return (typename LaneInteger<N>::type)__builtin_ia32_pmuludq128((FourHalves)a,

@@ -4,6 +4,10 @@
 #include <cstring>
 
 namespace qx {
+
+int32_t lanesInUse = 2;
+
+#ifdef QX_HAS_AVX2_BUILD
 namespace {
 
 // The lanes that the environment allows.
@@ -15,8 +19,6 @@ int32_t MostLanes() {
 }
 
 } // namespace
-
-int32_t lanesInUse = 2;
 
 // Looks at the processor and at which registers the operating system saves.
 __attribute__((constructor(101))) static void ChooseWidth() {
@@ -30,5 +32,6 @@ __attribute__((constructor(101))) static void ChooseWidth() {
         lanesInUse = 8;
 #endif
 }
+#endif
 
 } // namespace qx

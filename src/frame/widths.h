@@ -43,7 +43,11 @@ namespace qx {
 // The lanes of the routines that are called, 2, 4 or 8: the most that processor and operating system
 // offer, and the build has. QX_WIDTH=2 or QX_WIDTH=4 in the environment forces a smaller one. It is
 // found when the module is loaded, ahead of static initialisers; whoever comes still earlier meets 2.
+// ARM has 2 alone.
 extern int32_t lanesInUse;
+
+#if defined(__x86_64__) || defined(__i386__)
+#define QX_HAS_AVX2_BUILD 1
 
 template <auto Baseline, auto Avx2>
 struct ByWidth;
@@ -66,8 +70,6 @@ struct ByWidthTo8<Baseline, Avx2, Avx512> {
                                  : Baseline(arguments...);
     }
 };
-
-} // namespace qx
 
 #define QX_BY_WIDTH(result, name, parameters)                                                      \
     namespace baseline {                                                                           \
@@ -93,5 +95,27 @@ struct ByWidthTo8<Baseline, Avx2, Avx512> {
 #else
 #define QX_BY_WIDTH_TO_8(result, name, parameters) QX_BY_WIDTH(result, name, parameters)
 #endif
+
+#else
+
+template <auto Baseline>
+struct OfOneWidth;
+template <class Result, class... Arguments, Result (*Baseline)(Arguments...)>
+struct OfOneWidth<Baseline> {
+    __attribute__((always_inline)) Result operator()(Arguments... arguments) const {
+        return Baseline(arguments...);
+    }
+};
+
+#define QX_BY_WIDTH(result, name, parameters)                                                      \
+    namespace baseline {                                                                           \
+    result name parameters;                                                                        \
+    }                                                                                              \
+    constexpr OfOneWidth<baseline::name> name{};
+#define QX_BY_WIDTH_TO_8(result, name, parameters) QX_BY_WIDTH(result, name, parameters)
+
+#endif
+
+} // namespace qx
 
 #endif

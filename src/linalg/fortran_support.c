@@ -38,6 +38,18 @@ long lround(double x) { return Nearest(x); }
 long lroundf(float x) { return Nearest((double)x); }
 float logf(float x) { return (float)log((double)x); }
 
+/* x^n. The one of the compiler's run-time would come from the process. */
+double __powidf2(double x, int n) {
+    unsigned left = n < 0 ? 0u - (unsigned)n : (unsigned)n;
+    double power = left % 2 != 0 ? x : 1.0;
+    while ((left >>= 1) != 0) {
+        x *= x;
+        if (left % 2 != 0)
+            power *= x;
+    }
+    return n < 0 ? 1.0 / power : power;
+}
+
 /* BLAS and LAPACK report a bad argument here, which none of our calls has. The process is the
    host's: nothing is printed, and nobody is stopped. */
 void xerbla_(const char *name, const int *argument, size_t nameLength) {

@@ -159,7 +159,7 @@ inline void SumTaps(RealSums, const double *vectors, const double *tap, int taps
 #pragma GCC unroll 16
         for (int p = 1; p < together; ++p) {
             L value = L::load(v + p * lanes);
-            asm("" : "+x"(value.v)); // read once, not once per product
+            KeepInRegister(value);
             sum[p - 1] = sum[p - 1] + second * value;
             sum[p] = sum[p] + first * value;
         }

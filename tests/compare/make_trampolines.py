@@ -20,10 +20,15 @@ def main():
         f'        ".globl {name}\\n"\n'
         + ("" if options.show else f'        ".hidden {name}\\n"\n')
         + f'        ".type {name}, @function\\n"\n'
-        f'        "{name}: jmp *qxExportTargets+{8 * place}(%rip)\\n"\n'
+        f'        "{name}: " JUMP_BY("qxExportTargets+{8 * place}") "\\n"\n'
         for place, name in enumerate(names) if name not in options.but)
     text = ('#include "tests/compare/trampolines.h"\n\n'
             f'void *qxExportTargets[{len(names)}];\n\n'
+            "#ifdef __aarch64__\n"
+            '#define JUMP_BY(word) "adrp x16, " word "; ldr x16, [x16, :lo12:" word "]; br x16"\n'
+            "#else\n"
+            '#define JUMP_BY(word) "jmp *" word "(%rip)"\n'
+            "#endif\n\n"
             '__asm__(".text\\n"\n' + jumps + ");\n\n"
             "namespace qx::test {\n\nconst std::vector<const char *> &ExportNames() {\n"
             "    static const std::vector<const char *> all = {"

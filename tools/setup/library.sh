@@ -11,6 +11,7 @@
 # the bits rest on: the pinned files, our patches, the script with its flags, the compiler. The scripts
 # take `target`, and `find` where nothing is to be built, from their arguments.
 . "$(dirname "${BASH_SOURCE[0]}")/common.sh"
+. "$(dirname "${BASH_SOURCE[0]}")/targets.sh"
 
 setup=$(cd "$(dirname "${BASH_SOURCE[0]}")" && pwd)
 lock="$setup/sources.lock"
@@ -25,7 +26,7 @@ pinned() {
 recipe() {
     local package=$1 compiler=$2
     shift 2
-    { pinned "$package" && echo "$compiler" && cat "$0" "$@" && patches "$package" | xargs -r cat; } |
+    { pinned "$package" && echo "$compiler" && cat "$0" "$setup/targets.sh" "$@" && patches "$package" | xargs -r cat; } |
         sha256sum | cut -c 1-12
 }
 

@@ -154,6 +154,7 @@ TYPED_TEST(LanePairsTest, TransposeBlocksAndReachPartsOfVectors) {
     }
 }
 
+#ifdef QX_HAS_AVX2_BUILD
 TEST(Widths, AreTheProcessorsUnlessTheEnvironmentForcesASmallerOne) {
     int32_t widest = __builtin_cpu_supports("avx2") ? 4 : 2;
 #ifdef QX_HAS_EIGHT_LANES
@@ -166,5 +167,6 @@ TEST(Widths, AreTheProcessorsUnlessTheEnvironmentForcesASmallerOne) {
     if (widest < 8 && most >= 8)
         GTEST_SKIP() << "no routines of eight lanes here; the other tests ran with " << widest;
 }
+#endif
 
 } // namespace
