@@ -101,16 +101,16 @@ private:
 // The cell of each observation. ErrAnovaFactorEmpty, ErrAnovaCellCount, ErrOutOfMemory.
 ErrorCode AssignCells(const FactorialDesign &design, const Layout &layout,
                       Scratch<ElementType::I32> &cellOf) {
-    if (const ErrorCode failed = cellOf.allocate(design.n))
+    if (const ErrorCode failed = cellOf.allocate(design.n()))
         return failed;
-    for (int32_t k = 0; k < design.n; ++k)
+    for (int32_t k = 0; k < design.n(); ++k)
         cellOf[k] = 0;
     for (int i = 0; i < design.factors; ++i) {
         const Factor &factor = design.factor[i];
         Levels levels;
         if (const ErrorCode failed = levels.reserve(factor.levels))
             return failed;
-        for (int32_t k = 0; k < design.n; ++k) {
+        for (int32_t k = 0; k < design.n(); ++k) {
             const int32_t place = levels.placeOf(factor.labels[k]);
             if (place < 0)
                 return ErrAnovaFactorEmpty;
@@ -126,7 +126,7 @@ ErrorCode AssignCells(const FactorialDesign &design, const Layout &layout,
     const auto cells = static_cast<std::ptrdiff_t>(layout.cells());
     for (std::ptrdiff_t cell = 0; cell < cells; ++cell)
         counts[cell] = 0;
-    for (int32_t k = 0; k < design.n; ++k)
+    for (int32_t k = 0; k < design.n(); ++k)
         ++counts[cellOf[k]];
     for (std::ptrdiff_t cell = 0; cell < cells; ++cell)
         if (counts[cell] != design.observations)
@@ -140,7 +140,7 @@ public:
     explicit ScaledData(const FactorialDesign &design) : y_(design.y) {
         double least = y_[0];
         double largest = y_[0];
-        for (int32_t k = 1; k < design.n; ++k) {
+        for (int32_t k = 1; k < design.n(); ++k) {
             const double value = y_[k]; // whose address is aligned, unlike an element's
             least = std::min(least, value);
             largest = std::max(largest, value);
@@ -159,7 +159,7 @@ public:
     double unscaledSquare(double x) const { return x / scale_ / scale_; }
 
 private:
-    const DBL *y_;
+    ConstRealVector y_;
     double scale_ = 1.0;
     double spread_ = 0.0;
 };
@@ -177,10 +177,10 @@ ErrorCode CellMeans(const FactorialDesign &design, const Layout &layout, const S
     Scratch<ElementType::DBL> first;
     if (const ErrorCode failed = first.allocate(layout.cells()))
         return failed;
-    for (int32_t k = design.n - 1; k >= 0; --k)
+    for (int32_t k = design.n() - 1; k >= 0; --k)
         first[cellOf[k]] = data.at(k);
     const std::ptrdiff_t start = layout.start(layout.all());
-    for (int32_t k = 0; k < design.n; ++k)
+    for (int32_t k = 0; k < design.n(); ++k)
         means.add(start + cellOf[k], ExactSum(data.at(k), -first[cellOf[k]]));
     const auto cells = static_cast<std::ptrdiff_t>(layout.cells());
     for (std::ptrdiff_t cell = 0; cell < cells; ++cell)
@@ -243,16 +243,16 @@ ErrorCode SquareDeviations(const FactorialDesign &design, const Layout &layout,
     MarginalMeans(layout, means);
 
     const auto rounded = [&](Extended sum) {
-        return WithoutRounding(sum, design.n, data.spread());
+        return WithoutRounding(sum, design.n(), data.spread());
     };
     for (int subset = 1; subset < layout.subsets(); ++subset) {
-        const auto share = static_cast<double>(design.n / layout.cells(subset));
+        const auto share = static_cast<double>(design.n() / layout.cells(subset));
         sums->effect[subset] = rounded(EffectSquares(layout, means, subset) * Whole(share));
     }
     const Extended grandMean = means.at(0);
     const std::ptrdiff_t start = layout.start(layout.all());
     sums->error = sums->total = Whole(0.0);
-    for (int32_t k = 0; k < design.n; ++k) {
+    for (int32_t k = 0; k < design.n(); ++k) {
         const Extended value = data.shifted(data.at(k));
         sums->error = sums->error + Square(value - means.at(start + cellOf[k]));
         sums->total = sums->total + Square(value - grandMean);
@@ -351,7 +351,7 @@ ErrorCode FactorialAnova(const FactorialDesign &design, const double *significan
     Scratch<ElementType::I32> cellOf;
     if (const ErrorCode failed = AssignCells(design, layout, cellOf))
         return failed;
-    for (int32_t k = 0; k < design.n; ++k)
+    for (int32_t k = 0; k < design.n(); ++k)
         if (!std::isfinite(design.y[k]))
             return ErrNaNInData;
     if (significance != nullptr && !(*significance >= 0.0 && *significance <= 1.0))
@@ -373,8 +373,8 @@ ErrorCode FactorialAnova(const FactorialDesign &design, const double *significan
         squares.effect[subset] = MeanOf(sums.effect[subset], layout.degrees(subset));
     if (!isReplicated)
         sums.error = sums.effect[layout.all()];
-    squares.error =
-        MeanOf(sums.error, isReplicated ? design.n - layout.cells() : layout.degrees(layout.all()));
+    squares.error = MeanOf(sums.error, isReplicated ? design.n() - layout.cells()
+                                                    : layout.degrees(layout.all()));
 
     const auto described = [&](Extended sum, double degrees) {
         AnovaSource source = noSource;
@@ -402,7 +402,7 @@ ErrorCode FactorialAnova(const FactorialDesign &design, const double *significan
     }
     table->source[at] = described(sums.error, squares.error.degrees);
     table->source[at++].meanSquare = data.unscaledSquare(squares.error.value.high);
-    table->source[at++] = described(sums.total, design.n - 1.0);
+    table->source[at++] = described(sums.total, design.n() - 1.0);
     table->sources = at;
     return 0;
 }

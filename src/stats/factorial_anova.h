@@ -1,26 +1,28 @@
 #ifndef QX_STATS_FACTORIAL_ANOVA_H
 #define QX_STATS_FACTORIAL_ANOVA_H
 
+#include "frame/views.h"
 #include "qx/errors.h"
-#include "qx/types.h"
 
 namespace qx {
 
 constexpr int maxFactors = 3;
 
 struct Factor {
-    const I32 *labels; // one for each observation
+    ConstVectorView<ElementType::I32> labels; // one for each observation
     int32_t levels;
     bool isRandom;
 };
 
-// Observations in crossed factors: n is the product of the levels and the observations per cell.
+// Observations in crossed factors: their number is the product of the levels and the observations
+// per cell.
 struct FactorialDesign {
-    const DBL *y;
-    int32_t n;
+    ConstRealVector y;
     int32_t observations; // per cell; 1 only where all factors are fixed
     int factors;          // 2 or 3
     Factor factor[maxFactors];
+
+    int32_t n() const { return static_cast<int32_t>(y.size()); }
 };
 
 // NaN where the source has no such number.

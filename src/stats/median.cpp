@@ -4,7 +4,6 @@
 
 #include <algorithm>
 #include <cmath>
-#include <cstring>
 
 namespace qx {
 
@@ -15,12 +14,13 @@ struct Middle {
     double lower, upper;
 };
 
-bool HasNaN(const DBL *x, int32_t n) {
-    constexpr int32_t block = 256; // whole blocks take no branch per element
-    int32_t i = 0;
+bool HasNaN(ConstRealVector x) {
+    constexpr std::ptrdiff_t block = 256; // whole blocks take no branch per element
+    const std::ptrdiff_t n = x.size();
+    std::ptrdiff_t i = 0;
     for (; n - i >= block; i += block) {
         int64_t count = 0;
-        for (int32_t j = 0; j < block; ++j)
+        for (std::ptrdiff_t j = 0; j < block; ++j)
             count += x[i + j] != x[i + j];
         if (count != 0)
             return true;
@@ -31,38 +31,40 @@ bool HasNaN(const DBL *x, int32_t n) {
     return false;
 }
 
-// Ranks k - 1 and k of a[0..n-1], k at least 1 unless n is 1.
-Middle SelectPair(DBL *a, int32_t n, int32_t k) {
-    SelectKth({a, n}, k);
+// Ranks k - 1 and k, k at least 1 unless there is one element.
+Middle SelectPair(RealVector a, int32_t k) {
+    SelectKth(a, k);
     double lower = a[0];
     for (int32_t i = 1; i < k; ++i)
         lower = a[i] > lower ? a[i] : lower;
     return {lower, a[k]};
 }
 
-// Puts `count` elements of x at random places into the sample.
-void TakeSample(const DBL *x, int32_t n, DBL *sample, int32_t count) {
+// Fills the sample with elements of x from random places.
+void TakeSample(ConstRealVector x, RealVector sample) {
     uint32_t random = 1; // linear congruences (D. Knuth, The Art of Computer Programming 2, 1981)
-    for (int32_t i = 0; i < count; ++i) {
+    const auto n = static_cast<uint64_t>(x.size());
+    for (std::ptrdiff_t i = 0; i < sample.size(); ++i) {
         random = random * 1664525U + 1013904223U;
-        sample[i] = x[uint64_t{random} * static_cast<uint64_t>(n) >> 32];
+        sample[i] = x[static_cast<std::ptrdiff_t>(uint64_t{random} * n >> 32)];
     }
 }
 
 // Brackets the middle between two elements of a sample, so that one pass over x leaves a few
 // elements to select from (R. Floyd, R. Rivest: Expected time bounds for selection, 1975). False
 // where the middle lies outside the bracket, or is a zero whose sign the order decides.
-bool FindByBracket(const DBL *x, int32_t n, DBL *work, Middle *middle) {
+bool FindByBracket(ConstRealVector x, RealVector work, Middle *middle) {
+    const auto n = static_cast<int32_t>(x.size());
     const int32_t k = n / 2;
     int32_t sampleSize = 64;
     while (std::sqrt(double{1} * sampleSize) * sampleSize < n) // n to the power of 2/3
         sampleSize *= 2;
-    TakeSample(x, n, work, sampleSize);
+    TakeSample(x, work.part(0, sampleSize));
     // The middle is this near to that of the sample in 99 of 100 random arrays.
     const auto gap = static_cast<int32_t>(1.3 * std::sqrt(double{1} * sampleSize)) + 1;
-    SelectKth({work, sampleSize}, sampleSize / 2 + gap);
+    SelectKth(work.part(0, sampleSize), sampleSize / 2 + gap);
     const double high = work[sampleSize / 2 + gap];
-    SelectKth({work, sampleSize / 2 + gap}, sampleSize / 2 - gap);
+    SelectKth(work.part(0, sampleSize / 2 + gap), sampleSize / 2 - gap);
     const double low = work[sampleSize / 2 - gap];
 
     int32_t below = 0;
@@ -81,53 +83,52 @@ bool FindByBracket(const DBL *x, int32_t n, DBL *work, Middle *middle) {
     if (low <= 0.0 && 0.0 <= high)
         for (int32_t i = 0; i < inside; ++i)
             negativeZeros += work[i] == 0.0 && std::signbit(work[i]);
-    *middle = low == high ? Middle{low, low} : SelectPair(work, inside, k - below);
+    *middle = low == high ? Middle{low, low} : SelectPair(work.part(0, inside), k - below);
     return middle->upper != 0.0 || negativeZeros == 0;
 }
 
 // Monotone data need no selection; false for others, and for a zero as above.
-bool ReadOff(const DBL *x, int32_t n, Middle *middle) {
-    const int32_t k = n / 2;
+bool ReadOff(ConstRealVector x, Middle *middle) {
+    const std::ptrdiff_t n = x.size(), k = n / 2;
     if (n < 2)
         return false;
-    if (IsAscending({x, n}))
+    if (IsAscending(x))
         *middle = {x[k - 1], x[k]};
-    else if (IsDescending({x, n}))
+    else if (IsDescending(x))
         *middle = {x[n - k], x[n - 1 - k]};
     else
         return false;
     return middle->upper != 0.0;
 }
 
-Middle FindMiddle(const DBL *x, int32_t n, DBL *work) {
-    constexpr int32_t worthASample = 600;
+Middle FindMiddle(ConstRealVector x, RealVector work) {
+    constexpr std::ptrdiff_t worthASample = 600;
     Middle middle;
-    if (ReadOff(x, n, &middle))
+    if (ReadOff(x, &middle))
         return middle;
-    if (n >= worthASample && FindByBracket(x, n, work, &middle))
+    if (x.size() >= worthASample && FindByBracket(x, work, &middle))
         return middle;
-    std::memcpy(work, x, static_cast<std::size_t>(n) * sizeof(DBL));
-    return SelectPair(work, n, n / 2);
+    Copy<ElementType::DBL>(x, work);
+    return SelectPair(work, static_cast<int32_t>(x.size() / 2));
 }
 
-double MedianOf(const Middle &middle, int32_t n) {
+double MedianOf(const Middle &middle, std::ptrdiff_t n) {
     return n % 2 != 0 ? middle.upper : (middle.lower + middle.upper) * 0.5;
 }
 
 } // namespace
 
-ErrorCode ArrayMedian(ConstRealVector elements, DBL *median) {
-    const DBL *const x = elements.data();
-    const auto n = static_cast<int32_t>(elements.size());
-    if (n < 1)
+ErrorCode ArrayMedian(ConstRealVector x, DBL *median) {
+    if (x.isEmpty())
         return ErrEmptyInput;
-    if (HasNaN(x, n))
+    if (HasNaN(x))
         return ErrNaNInData;
-    Scratch<ElementType::DBL> work;
-    if (const ErrorCode status = work.allocate(n))
-        return status;
-    *median = MedianOf(FindMiddle(x, n, work.data()), n);
-    return work.release();
+    RealVector work;
+    ScratchParts memory;
+    if (const ErrorCode failed = memory.take(Sized(work, x.size())))
+        return failed;
+    *median = MedianOf(FindMiddle(x, work), x.size());
+    return memory.release();
 }
 
 } // namespace qx

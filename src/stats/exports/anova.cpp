@@ -86,9 +86,9 @@ Outcome Factorial(In<DBL1D> y, GivenFactors factors, int32_t observations,
               ErrAnovaNegativeSelector},
              {!HasCount(factors, observations, y.size()), ErrAnovaCountMismatch}}))
         return bad;
-    FactorialDesign design = {y.data(), y.size(), observations, 0, {}};
+    FactorialDesign design = {y.view(), observations, 0, {}};
     for (Given factor : factors)
-        design.factor[design.factors++] = {factor.labels.data(),
+        design.factor[design.factors++] = {factor.labels.view(),
                                            static_cast<int32_t>(factor.size()), factor.isRandom()};
     FactorialTable table;
     if (const Outcome bad = FactorialAnova(design, significance, &table))
