@@ -31,6 +31,7 @@ struct Block {
 struct Registry {
     std::recursive_mutex lock;
     std::deque<HostRecord> records; // of all threads there have been
+    std::vector<HostRecord *> left; // of those that need none any more
     std::map<void *, Block> live;   // by handle
     std::deque<Block> quarantine;   // poisoned
     std::map<std::pair<SweepProcedure, void *>, int32_t> sweeps;
@@ -105,14 +106,27 @@ bool IsCodeOf(const Block &block, int32_t typeCode, int32_t count) {
 // Nothing that is thread_local may have a destructor: on 32-bit Windows the run-time of the
 // compiler frees the memory of such objects before it destroys them, so a destructor would free
 // whatever stands there by then. The records therefore stay to the end of the process.
+namespace {
+thread_local HostRecord *threadsRecord = nullptr;
+}
+
 HostRecord &Host() {
-    thread_local HostRecord *record = nullptr;
-    if (record == nullptr) {
+    if (threadsRecord == nullptr) {
         const HeapProbe::Pause pause;
-        const std::lock_guard hold(Blocks().lock);
-        record = &Blocks().records.emplace_back();
+        Registry &registry = Blocks();
+        const std::lock_guard hold(registry.lock);
+        if (registry.left.empty())
+            registry.left.push_back(&registry.records.emplace_back());
+        threadsRecord = registry.left.back();
+        registry.left.pop_back();
     }
-    return *record;
+    return *threadsRecord;
+}
+
+void LeaveHost() {
+    ResetHost();
+    const std::lock_guard hold(Blocks().lock);
+    Blocks().left.push_back(std::exchange(threadsRecord, nullptr));
 }
 
 void ResetHost(int32_t failAt, int32_t failStatus) {
@@ -158,6 +172,15 @@ void CheckBlocks() {
         CheckGuards(block);
     for (const Block &block : Blocks().quarantine)
         Expect(block.payload(), block.size, deadByte, "a write to a block that has moved");
+}
+
+void ForgetMovedBlocks() {
+    const std::lock_guard hold(Blocks().lock);
+    CheckBlocks();
+    for (const Block &block : Blocks().quarantine)
+        std::free(block.memory);
+    Blocks().quarantine.clear();
+    Blocks().quarantine.shrink_to_fit();
 }
 
 int LiveBlocks() {

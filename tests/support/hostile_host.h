@@ -37,6 +37,8 @@ struct HostRecord {
     unsigned char freshByte = 0xA5;
 };
 HostRecord &Host();
+// The calling thread makes no more calls; its record is another's from here on.
+void LeaveHost();
 constexpr int32_t everyReshape = -1; // as `failAt`
 constexpr int32_t statusNoMemory = 2;
 // Forgets the calling thread's record and sets which reshape fails.
@@ -51,6 +53,8 @@ int RegisteredSweeps();
 
 // Throws if a guard or a poisoned byte has changed since; called by every reshape and free too.
 void CheckBlocks();
+// Checks, and gives back what is kept of blocks that have moved.
+void ForgetMovedBlocks();
 int LiveBlocks();
 
 // Elements with the alignment of their C++ type, for values on their own.
