@@ -193,7 +193,7 @@ struct Memory {
 };
 
 Memory MemoryNow() {
-    ForgetMovedBlocks();
+    std::thread(ForgetMovedBlocks).join(); // whose cache of the heap ends with it
     malloc_trim(0);
     const struct mallinfo2 heap = mallinfo2();
     int64_t pages = 0, resident = 0;
@@ -233,7 +233,7 @@ void RunPhase(const std::vector<Step> &steps, uint64_t number, double seconds, P
 }
 
 // A phase may leave this much behind in the caches of the C library.
-constexpr int64_t heapNoise = 256 << 10, residentNoise = 16 << 20;
+constexpr int64_t heapNoise = 16 << 10, residentNoise = 16 << 20;
 
 int Main() {
     // So that the C library keeps little of what has been given back.
@@ -243,8 +243,8 @@ int Main() {
     CompareWithAccepted();
     const std::vector<Step> steps = AllSteps();
     constexpr uint32_t regions[] = {1U << 20, 4U << 20, 16U << 20, 64U << 20};
-    // The first phases fill what stays: four of each kind, or all but the last third of a short run.
-    const double each = std::clamp(options.seconds / 60, 0.25, 15.0);
+    // The first minute fills what stays, or all but the last third of a short run.
+    const double each = std::clamp(options.seconds / 60, 0.25, 3.75);
     const auto phases = static_cast<uint64_t>(options.seconds / each);
     const uint64_t warm = std::min<uint64_t>(phases * 2 / 3, 16);
     Memory first = {0, 0, 0}, last = {0, 0, 0};
