@@ -149,6 +149,11 @@ void ChangeWorkspace(Noise &noise, uint32_t region) {
         Tell("the workspace", "gives %d", status.code);
 }
 
+bool IsOutOfMemory(ErrorCode status) {
+    return status == ErrOutOfMemory || status == ErrMeasureOutOfMemory ||
+           status == ErrMultirateBuffer;
+}
+
 void Run(const Step &step, NodeWords &node, Phase &phase) {
     Call call(step.n);
     call.use(node);
@@ -157,7 +162,7 @@ void Run(const Step &step, NodeWords &node, Phase &phase) {
     ++phase.calls;
     if (call.outputHash(status) == step.hash)
         return;
-    const bool isRefusal = status == ErrOutOfMemory;
+    const bool isRefusal = IsOutOfMemory(status);
     phase.refused += isRefusal;
     if (isRefusal && !phase.mayRefuse())
         Tell(step.recipe->name, "refused at n = %d though it needs %" PRId64 " of %u bytes", step.n,
