@@ -183,8 +183,10 @@ void CheckRepetition(const char *name, const Outcome &first, const Outcome &seco
         Tell("%s gives another result (%d, %d)", apart, first.status, second.status);
 }
 
-void CheckHonesty(const char *name, const Outcome &refused, const Outcome &granted) {
-    if (refused.status < 0 || refused.status == statusNoMemory ||
+void CheckHonesty(const char *name, const Disturbance &disturbance, const Outcome &refused,
+                  const Outcome &granted) {
+    const bool isHosts = disturbance.refuseAt != 0 && refused.status == disturbance.refusal;
+    if (refused.status < 0 || refused.status == statusNoMemory || isHosts ||
         IsKept(name, Oddity::OldContentStays) || IsKept(name, Oddity::RefusalPasses))
         return;
     if (options.threads > 1 && granted.status == ErrOutOfMemory) // of a region that others fill

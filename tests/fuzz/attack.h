@@ -94,7 +94,8 @@ void CheckRepetition(const char *name, const Outcome &first, const Outcome &seco
 
 // A call that is successful while the host or the heap refuses has to have the outcome that it has
 // when they grant everything.
-void CheckHonesty(const char *name, const Outcome &refused, const Outcome &granted);
+void CheckHonesty(const char *name, const Disturbance &disturbance, const Outcome &refused,
+                  const Outcome &granted);
 
 // For each resize and for some allocations of a call its refusal, and a workspace or two that are
 // too small for it.

@@ -200,9 +200,8 @@ Outcome RunRecipeHonesty(Random &random, const Recipe &recipe) {
     ForSomeRefusals(random, calm, [&](const Disturbance &disturbance) {
         spoiling.disturbance = disturbance;
         const TinyWorkspace workspace(disturbance.workspace);
-        const Outcome refused = RunOnce(recipe, spoiling, 0x17, Made::AsSpoilt);
-        if ((recipe.quirks & (MemoryFailureMayPass | RefusalPasses)) == 0)
-            CheckHonesty(recipe.exportName().c_str(), refused, granted);
+        CheckHonesty(recipe.exportName().c_str(), disturbance,
+                     RunOnce(recipe, spoiling, 0x17, Made::AsSpoilt), granted);
     });
     return granted;
 }

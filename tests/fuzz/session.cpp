@@ -41,14 +41,13 @@ uint64_t KindOf(void *word) {
 
 } // namespace
 
-Session::Words::~Words() {
+void Session::Words::release() {
     heap.release([this] {
-        for (void *slot : slots)
-            RunSweepOf(slot);
-        if (instance != nullptr && release != nullptr)
-            release(&instance);
+        for (void *&slot : slots)
+            RunSweepOf(std::exchange(slot, nullptr));
+        if (instance != nullptr && releaseInstance != nullptr)
+            releaseInstance(&instance);
     });
-    heap.end();
 }
 
 std::vector<void *> Session::Words::all() const {
@@ -58,6 +57,8 @@ std::vector<void *> Session::Words::all() const {
 }
 
 Session::~Session() {
+    words_.release();
+    heap_.end();
     for (const Array &array : arrays_)
         detail::FreeBlock(array.handle);
 }
@@ -125,7 +126,7 @@ Outcome Session::call(const Scenario &scenario, const Places &places, Words &wor
         values.push_back(value);
     }
     if (words.instance == nullptr)
-        words.release = thunk.release;
+        words.releaseInstance = thunk.release;
     const Observed seen = Attacked(scenario.disturbance, 0x17, [&] { return thunk.call(values.data()); });
     words.heap.add(seen);
     const ErrorCode status = hasError ? error : thunk.returnsCode ? seen.result : 0;
@@ -180,7 +181,7 @@ Outcome Session::step(Random &random, const Thunk &thunk) {
         std::vector<Array> copies;
         for (const Array &array : arrays_)
             copies.push_back({array.parameter, copyOf(array)});
-        Words fresh;
+        Words fresh(heap_);
         const Outcome alone = call(scenario, places, fresh, copies);
         for (const Array &copy : copies)
             detail::FreeBlock(copy.handle);

@@ -28,10 +28,11 @@ private:
     struct Words {
         std::array<void *, 4> slots = {};
         void *instance = nullptr;
-        int32_t (*release)(void **) = nullptr;
-        HeapBalance heap;
-        Words() = default;
-        ~Words();
+        int32_t (*releaseInstance)(void **) = nullptr;
+        HeapBalance &heap;
+        explicit Words(HeapBalance &sessions) : heap(sessions) {}
+        ~Words() { release(); }
+        void release();
         Words(const Words &) = delete;
         Words &operator=(const Words &) = delete;
         std::vector<void *> all() const;
@@ -49,7 +50,8 @@ private:
     static Outcome call(const Scenario &scenario, const Places &places, Words &words,
                         const std::vector<Array> &arrays);
 
-    Words words_;
+    HeapBalance heap_; // of all words, which share plans
+    Words words_{heap_};
     std::vector<Array> arrays_;
 };
 

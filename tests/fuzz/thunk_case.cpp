@@ -137,7 +137,7 @@ Outcome RunThunkHonesty(Random &random, const Thunk &thunk) {
     ForSomeRefusals(random, calm, [&](const Disturbance &disturbance) {
         scenario.disturbance = disturbance;
         const TinyWorkspace workspace(disturbance.workspace);
-        CheckHonesty(thunk.name, CallAlone(scenario, {}), granted);
+        CheckHonesty(thunk.name, disturbance, CallAlone(scenario, {}), granted);
     });
     return granted;
 }

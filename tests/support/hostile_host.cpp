@@ -87,9 +87,9 @@ Block Allocate(std::size_t size, int32_t numDims, int32_t typeCode) {
 
 void Expect(const unsigned char *bytes, std::size_t count, unsigned char value, const char *what) {
     Allow(bytes, count);
-    for (std::size_t i = 0; i < count; ++i)
-        if (bytes[i] != value)
-            throw std::logic_error(what);
+    // All are as the first one where each is as the next one.
+    if (count > 0 && (bytes[0] != value || std::memcmp(bytes, bytes + 1, count - 1) != 0))
+        throw std::logic_error(what);
     Forbid(bytes, count);
 }
 
