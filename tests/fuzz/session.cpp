@@ -188,16 +188,18 @@ Outcome Session::step(Random &random, const Thunk &thunk) {
         outcome = call(scenario, places, words_, arrays_);
         // A word that holds a cell of another kind is refused and left as it is.
         bool isOfAnotherKind = false;
-        const std::vector<void *> wanted = fresh.all();
+        const std::vector<void *> wanted = fresh.all(), after = words_.all();
         for (std::size_t i = 0; i < places.size(); ++i) {
             const Kind kind = thunk.parameters[i].kind;
             if (kind != Kind::Slot && kind != Kind::Instance)
                 continue;
             const std::size_t word = kind == Kind::Slot ? places[i] : before.size() - 1;
-            isOfAnotherKind |= before[word] != nullptr && KindOf(wanted[word]) != KindOf(before[word]);
+            if (before[word] == nullptr || KindOf(wanted[word]) == KindOf(before[word]))
+                continue;
+            isOfAnotherKind = true;
+            if (outcome.status == ErrInternal && after[word] != before[word])
+                Tell("a word that is refused has changed");
         }
-        if (outcome.status == ErrInternal && isOfAnotherKind && words_.all() != before)
-            Tell("a word that is refused has changed");
         if (outcome.status != ErrInternal || !isOfAnotherKind)
             CheckRepetition(thunk.name, outcome, alone, "a word that has been used");
     }
