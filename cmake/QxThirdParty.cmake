@@ -17,12 +17,18 @@ file(GLOB recipes CONFIGURE_DEPENDS ${PROJECT_SOURCE_DIR}/tools/setup/*
 list(FILTER recipes EXCLUDE REGEX "/patches$")
 set_property(DIRECTORY APPEND PROPERTY CMAKE_CONFIGURE_DEPENDS ${recipes})
 
+set(QX_SETUP_TARGET_libm ${QX_SETUP_TARGET})
+set(QX_SETUP_TARGET_lapack ${QX_SETUP_TARGET})
+if(QX_SANITIZE MATCHES address)
+    set(QX_SETUP_TARGET_lapack linux-asan) # so that compiled Fortran is watched, too
+    set(setup "./setup all")
+endif()
 foreach(library IN ITEMS libm lapack)
-    execute_process(COMMAND ${PROJECT_SOURCE_DIR}/tools/setup/${library} ${QX_SETUP_TARGET} find
+    execute_process(COMMAND ${PROJECT_SOURCE_DIR}/tools/setup/${library} ${QX_SETUP_TARGET_${library}} find
         OUTPUT_VARIABLE archive OUTPUT_STRIP_TRAILING_WHITESPACE RESULT_VARIABLE missing)
     if(missing)
         message(FATAL_ERROR "What the module carries is not built yet (${library} for "
-            "${QX_SETUP_TARGET}): run ${setup} in ${PROJECT_SOURCE_DIR}")
+            "${QX_SETUP_TARGET_${library}}): run ${setup} in ${PROJECT_SOURCE_DIR}")
     endif()
     add_library(qx${library} STATIC IMPORTED GLOBAL)
     cmake_path(GET archive PARENT_PATH folder)

@@ -49,51 +49,64 @@ inline const FFTPlan *HeldPlan(const PlanSlot *slot) {
 
 // The two ways to keep plans across the calls of a node; a plain export and its _IDP twin differ
 // in nothing else. A length beyond int32, which some transforms compute from theirs, is memory
-// that cannot be had.
+// that cannot be had. The plans are remembered: within a reshape the host may change the words.
 
 // In words that the caller owns, swept by the host.
 class KeepInSlots {
 public:
     explicit KeepInSlots(PlanSlot *first, PlanSlot *second = nullptr)
         : first_(first), second_(second) {}
-    ErrorCode acquire(int64_t n) const { return acquire(first_, n); }
+    ErrorCode acquire(int64_t n) { return acquire(first_, n, &plan_); }
     // One slot given twice holds one plan.
-    ErrorCode acquireSecond(int64_t n) const {
-        if (second_ == first_ && plan()->length != n)
+    ErrorCode acquireSecond(int64_t n) {
+        if (second_ == first_ && plan_->length != n)
             return ErrInternal;
-        return acquire(second_, n);
+        return acquire(second_, n, &secondPlan_);
     }
-    const FFTPlan *plan() const { return HeldPlan(first_); }
-    const FFTPlan *secondPlan() const { return HeldPlan(second_); }
+    const FFTPlan *plan() const { return plan_; }
+    const FFTPlan *secondPlan() const { return secondPlan_; }
 
 private:
-    static ErrorCode acquire(PlanSlot *slot, int64_t n) {
-        return IsPlanLength(n) ? PlanSlotAcquire(slot, static_cast<int32_t>(n)) : ErrOutOfMemory;
+    static ErrorCode acquire(PlanSlot *slot, int64_t n, const FFTPlan **plan) {
+        if (!IsPlanLength(n))
+            return ErrOutOfMemory;
+        if (const ErrorCode failed = PlanSlotAcquire(slot, static_cast<int32_t>(n)))
+            return failed;
+        *plan = HeldPlan(slot);
+        return 0;
     }
 
     PlanSlot *first_;
     PlanSlot *second_;
+    const FFTPlan *plan_ = nullptr, *secondPlan_ = nullptr;
 };
 
 // In the host's instance data, given back through TransformUnreserveProc.
 class KeepInInstance {
 public:
     explicit KeepInInstance(InstanceWord *word) : word_(word) {}
-    ErrorCode acquire(int64_t n) const { return acquire(&TransformInstance::first, n); }
-    ErrorCode acquireSecond(int64_t n) const { return acquire(&TransformInstance::second, n); }
-    const FFTPlan *plan() const { return HeldPlan(&instance()->first); }
-    const FFTPlan *secondPlan() const { return HeldPlan(&instance()->second); }
+    ErrorCode acquire(int64_t n) { return acquire(&TransformInstance::first, n, &plan_); }
+    ErrorCode acquireSecond(int64_t n) {
+        return acquire(&TransformInstance::second, n, &secondPlan_);
+    }
+    const FFTPlan *plan() const { return plan_; }
+    const FFTPlan *secondPlan() const { return secondPlan_; }
 
 private:
-    TransformInstance *instance() const { return static_cast<TransformInstance *>(*word_); }
-    ErrorCode acquire(PlanSlot TransformInstance::*slot, int64_t n) const {
+    ErrorCode acquire(PlanSlot TransformInstance::*which, int64_t n, const FFTPlan **plan) const {
         if (const ErrorCode failed = TransformInstanceReserve(word_))
             return failed;
-        return IsPlanLength(n) ? PlanSlotAcquireIDP(&(instance()->*slot), static_cast<int32_t>(n))
-                               : ErrOutOfMemory;
+        if (!IsPlanLength(n))
+            return ErrOutOfMemory;
+        PlanSlot *const slot = &(static_cast<TransformInstance *>(*word_)->*which);
+        if (const ErrorCode failed = PlanSlotAcquireIDP(slot, static_cast<int32_t>(n)))
+            return failed;
+        *plan = HeldPlan(slot);
+        return 0;
     }
 
     InstanceWord *word_;
+    const FFTPlan *plan_ = nullptr, *secondPlan_ = nullptr;
 };
 
 } // namespace qx

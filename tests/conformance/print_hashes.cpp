@@ -6,6 +6,6 @@
 // every target, compiler and optimisation level.
 int main() {
     for (const auto &[name, hash] : qx::test::HashEveryExport())
-        std::printf("%016llx %s\n", static_cast<unsigned long long>(hash), name.c_str());
+        std::printf("%s %s\n", qx::test::HashText(hash).c_str(), name.c_str());
     return 0;
 }

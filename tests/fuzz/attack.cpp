@@ -6,6 +6,7 @@
 #include "tests/support/heap_probe.h"
 #include "tests/support/hostile_host.h"
 
+#include <algorithm>
 #include <chrono>
 #include <cinttypes>
 #include <cstdarg>
@@ -23,6 +24,9 @@ Options options;
 Current currents[mostThreads];
 thread_local Current *current = currents;
 std::atomic<int> findings = 0;
+std::atomic<int64_t> callsMade = 0;
+// Small, so that time is bounded by the data and only a loop over a parameter can take long.
+std::size_t largestBlock = 4U << 20;
 
 namespace {
 
@@ -32,9 +36,6 @@ constexpr double slowness = 30;
 constexpr double slowness = 1;
 #endif
 constexpr double secondsPerCall = 5 * slowness; // of the processor
-// Neither the host nor the heap gives more in one piece, so that time is bounded by the data and
-// only a loop over a parameter can take long.
-constexpr std::size_t largestBlock = 4U << 20;
 
 double ProcessorSeconds() {
     timespec now;
@@ -45,6 +46,12 @@ double ProcessorSeconds() {
 const std::map<std::string, Documented> &DocumentedCodes() {
     static const auto all = ReadCodeList(QX_CODE_LIST);
     return all;
+}
+
+std::string HowToRepeat(const Current &at) {
+    const std::string kind = options.onlyKind.empty() ? "" : " --kind " + options.onlyKind;
+    return "--seed " + std::to_string(options.seed) + " --export " +
+           (at.name != nullptr ? at.name.load() : "") + " --round " + std::to_string(at.round) + kind;
 }
 
 } // namespace
@@ -60,18 +67,19 @@ void Tell(const char *format, ...) {
     const HeapProbe::Pause pause;
     const std::lock_guard hold(lock);
     const char *name = current->name != nullptr ? current->name.load() : "the workspace";
-    if (!told.insert(name + std::string(text).substr(0, 24)).second)
+    const char *called = current->called != nullptr ? current->called.load() : name;
+    if (!told.insert(called + std::string(text).substr(0, 24)).second)
         return;
     ++findings;
-    std::fprintf(stderr, "FOUND: %s: %s   (--seed %" PRIu64 " --export %s --round %" PRId64 ")\n",
-                 name, text, options.seed, name, current->round.load());
+    std::fprintf(stderr, "FOUND: %s: %s   (%s)\n", called, text, HowToRepeat(*current).c_str());
 }
 
 void TellWhereItEnded() {
     for (const Current &at : currents)
         if (at.round >= 0)
-            std::fprintf(stderr, "ENDED (--seed %" PRIu64 " --export %s --round %" PRId64 ")\n",
-                         options.seed, at.name.load(), at.round.load());
+            std::fprintf(stderr, "ENDED in %s (%s)\n",
+                         (at.called != nullptr ? at.called : at.name).load(),
+                         HowToRepeat(at).c_str());
 }
 
 void Watch(const std::atomic<bool> &done) {
@@ -105,12 +113,17 @@ Observed Observe(const Disturbance &disturbance, unsigned char rubbish,
     ResetHost(disturbance.refuseAt, disturbance.refusal);
     Host().largestBlock = largestBlock;
     Host().freshByte = rubbish;
+    Host().atReshape = disturbance.atReshape;
+    ++callsMade;
     Observed seen;
     const double before = ProcessorSeconds();
     try {
         const HeapProbe probe(disturbance.allocationFails, largestBlock, rubbish);
         seen.result = call();
         seen.lacksMemory = probe.refusals() > 0;
+        seen.allocations = probe.allocations();
+        seen.left = probe.liveAllocations();
+        seen.peakBytes = probe.peakBytes();
     } catch (const std::exception &error) {
         seen.fault = error.what();
     }
@@ -120,14 +133,14 @@ Observed Observe(const Disturbance &disturbance, unsigned char rubbish,
     return seen;
 }
 
-int32_t Attacked(const Disturbance &disturbance, unsigned char rubbish,
-                 const std::function<int32_t()> &call) {
+Observed Attacked(const Disturbance &disturbance, unsigned char rubbish,
+                  const std::function<int32_t()> &call) {
     const Observed seen = Observe(disturbance, rubbish, call);
     if (!seen.fault.empty())
         Tell("%s", seen.fault.c_str());
     if (seen.seconds > secondsPerCall)
         Tell("took %.1f s of the processor", seen.seconds);
-    return seen.result;
+    return seen;
 }
 
 void CheckStatus(const char *name, ErrorCode status, const Disturbance &disturbance, bool shares) {
@@ -168,6 +181,51 @@ void CheckRepetition(const char *name, const Outcome &first, const Outcome &seco
         return;
     if (first.hash != second.hash || first.status != second.status)
         Tell("%s gives another result (%d, %d)", apart, first.status, second.status);
+}
+
+void CheckHonesty(const char *name, const Disturbance &disturbance, const Outcome &refused,
+                  const Outcome &granted) {
+    const bool isHosts = disturbance.refuseAt != 0 && refused.status == disturbance.refusal;
+    if (refused.status < 0 || refused.status == statusNoMemory || isHosts ||
+        IsKept(name, Oddity::OldContentStays) || IsKept(name, Oddity::RefusalPasses))
+        return;
+    if (options.threads > 1 && granted.status == ErrOutOfMemory) // of a region that others fill
+        return;
+    if (refused.status != granted.status || refused.hash != granted.hash)
+        Tell("a refusal is a success with another result (%d, %d)", refused.status, granted.status);
+}
+
+void ForSomeRefusals(Random &random, const Observed &calm,
+                     const std::function<void(const Disturbance &)> &make) {
+    Disturbance some;
+    const auto resizes = static_cast<int32_t>(calm.reshapes.size());
+    for (some.refuseAt = 1; some.refuseAt <= std::min(resizes, 8); ++some.refuseAt) {
+        some.refusal = random.oneIn(2) ? statusNoMemory : 4711;
+        make(some);
+    }
+    some.refuseAt = some.refusal = 0;
+    for (int32_t i = 0; i < std::min(calm.allocations, 6); ++i) {
+        some.allocationFails = calm.allocations <= 6 ? i + 1 : 1 + random.below(calm.allocations);
+        make(some);
+    }
+    some.allocationFails = 0;
+    for (const int64_t part : {2, 8})
+        if (options.threads == 1 && calm.peakBytes > 0) {
+            some.workspace = static_cast<uint32_t>(calm.peakBytes / part + 1);
+            make(some);
+        }
+}
+
+void HeapBalance::release(const std::function<void()> &release) {
+    const HeapProbe probe;
+    release();
+    left_ += probe.liveAllocations();
+}
+
+// What threads share may be given back by another one.
+void HeapBalance::end() const {
+    if (left_ != 0 && options.threads == 1)
+        Tell("%" PRId64 " blocks of the heap are left", left_);
 }
 
 TinyWorkspace::TinyWorkspace(uint32_t size) : size_(size) {

@@ -17,11 +17,12 @@ namespace qx::test {
 
 struct Options {
     uint64_t seed = 1;
-    int64_t rounds = 0;
+    int64_t rounds = 0, calls = 0;
     double seconds = 0;
     int threads = 1;
     int64_t onlyRound = -1;
     std::string onlyExport;
+    std::string onlyKind; // of cases
 };
 extern Options options;
 
@@ -29,6 +30,7 @@ extern Options options;
 struct Current {
     std::atomic<int64_t> round = -1;
     std::atomic<const char *> name = nullptr;
+    std::atomic<const char *> called = nullptr; // in its case, where that is another export
     std::atomic<int64_t> since = 0;
 };
 constexpr int mostThreads = 64;
@@ -50,7 +52,10 @@ struct Disturbance {
     int32_t refuseAt = 0, refusal = 0; // the n-th resize, the host's status
     int32_t allocationFails = 0;       // the n-th
     uint32_t workspace = 0;            // bytes; 0 for none
-    bool isNone() const { return refuseAt == 0 && allocationFails == 0 && workspace == 0; }
+    std::function<void()> atReshape = nullptr;
+    bool isNone() const {
+        return refuseAt == 0 && allocationFails == 0 && workspace == 0 && !atReshape;
+    }
 };
 Disturbance SomeDisturbance(Random &random);
 
@@ -59,16 +64,23 @@ struct Observed {
     int32_t result = 0; // of the function
     std::vector<Reshape> reshapes;
     bool lacksMemory = false; // the heap has refused a request
+    int32_t allocations = 0;  // of the heap, refused ones included
+    int32_t left = 0;         // blocks of the heap that were taken and not given back
+    int64_t peakBytes = 0;    // of the heap
     std::string fault;        // what the host complains of
     double seconds = 0;       // of the processor
 };
+// Calls of exports in this process.
+extern std::atomic<int64_t> callsMade;
+// Neither the host nor the heap gives more in one piece.
+extern std::size_t largestBlock;
 // Makes the call in a host that refuses as told and whose new blocks, as those of the heap, hold
 // `rubbish`.
 Observed Observe(const Disturbance &disturbance, unsigned char rubbish,
                  const std::function<int32_t()> &call);
-// The same, and tells of a fault and of a long time. Returns the function result.
-int32_t Attacked(const Disturbance &disturbance, unsigned char rubbish,
-                 const std::function<int32_t()> &call);
+// The same, and tells of a fault and of a long time.
+Observed Attacked(const Disturbance &disturbance, unsigned char rubbish,
+                  const std::function<int32_t()> &call);
 // Tells of a code that the export does not document.
 void CheckStatus(const char *name, ErrorCode status, const Disturbance &disturbance, bool shares);
 // Tells of a touched byte outside the blocks, and ends the process: what comes after it would tell
@@ -79,6 +91,28 @@ void CheckRefusal(ErrorCode status, bool hasStatus);
 // A call and the one that `apart` names have to have the same outcome.
 void CheckRepetition(const char *name, const Outcome &first, const Outcome &second,
                      const char *apart);
+
+// A call that is successful while the host or the heap refuses has to have the outcome that it has
+// when they grant everything.
+void CheckHonesty(const char *name, const Disturbance &disturbance, const Outcome &refused,
+                  const Outcome &granted);
+
+// For each resize and for some allocations of a call its refusal, and a workspace or two that are
+// too small for it.
+void ForSomeRefusals(Random &random, const Observed &calm,
+                     const std::function<void(const Disturbance &)> &make);
+
+// Counts what calls take of the heap and give back. With `end` nothing may be left.
+class HeapBalance {
+public:
+    void add(const Observed &seen) { left_ += seen.left; }
+    // Gives back what a node holds, and counts that.
+    void release(const std::function<void()> &release);
+    void end() const;
+
+private:
+    int64_t left_ = 0;
+};
 
 // The workspace for one call in one thread.
 class TinyWorkspace {

@@ -13,6 +13,8 @@ enum class Oddity {
     SizeBeyondBlock,   // an array whose size is set although the host refused the resize
     DependsOnState,    // a result that depends on calls before, for a state of the process
     WorksInInput,      // an input that is work memory as well, and may be an output as an input may
+    RefusalPasses,     // a success with another result where the host or the heap refuses
+    AlwaysFails,       // no call is successful
     TimeFollowsNumber, // time that grows with a number by value, which therefore stays small here
 };
 
@@ -29,6 +31,12 @@ constexpr KeptOddity keptOddities[] = {
     {"AutoCorrelation", Oddity::SizeBeyondBlock, "the resize is not looked at"},
     {"AutoCorrelation80", Oddity::SizeBeyondBlock, "the resize is not looked at"},
     {"Deconvolution", Oddity::SizeBeyondBlock, "the resize is not looked at"},
+    {"EqsSetByLUDri_head", Oddity::AlwaysFails, "by its contract"},
+    {"CxEqsSetByLUDri_head", Oddity::AlwaysFails, "by its contract"},
+    {"AutoCorrelation", Oddity::RefusalPasses, "the resize is not looked at"},
+    {"AutoCorrelation80", Oddity::RefusalPasses, "the resize is not looked at"},
+    {"InvDCT_1DH", Oddity::RefusalPasses, "its work memory is not looked at"},
+    {"InvDCT_1DH_IDP", Oddity::RefusalPasses, "its work memory is not looked at"},
     {"ReComplexModulatorH", Oddity::OldContentStays, "where x is empty"},
     {"CxDZTH", Oddity::WorksInInput, "a longer one is folded in it"},
     {"CxDZTH_IDP", Oddity::WorksInInput, "a longer one is folded in it"},

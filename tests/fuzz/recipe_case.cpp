@@ -121,13 +121,19 @@ bool IsRepeatable(const RecipeSpoiling &spoiling) {
 }
 
 Outcome RunOnce(const Recipe &recipe, const RecipeSpoiling &spoiling, unsigned char rubbish,
-                Made made) {
+                Made made, Observed *observed = nullptr) {
     Call call(spoiling.n);
     Spoil(call, spoiling, made);
     const std::string name = recipe.exportName();
-    const int32_t result =
+    const Observed seen =
         Attacked(spoiling.disturbance, rubbish, [&] { return recipe.run(call); });
-    const ErrorCode status = call.status(result);
+    if (observed != nullptr)
+        *observed = seen;
+    HeapBalance heap;
+    heap.add(seen);
+    heap.release([&] { call.releaseNodes(); });
+    heap.end();
+    const ErrorCode status = call.status(seen.result);
     if (IsRefused(spoiling))
         CheckRefusal(status, (recipe.quirks & NoStatus) == 0);
     else if (status != ErrInternal || !spoiling.shared)
@@ -164,6 +170,40 @@ Outcome RunRecipeCase(Random &random, const Recipe &recipe) {
                         : spoiling.shared    ? "an array for each handle"
                                              : "the same call");
     return outcome;
+}
+
+Outcome RunRecipeMeetings(Random &random, const Recipe &recipe) {
+    RecipeSpoiling spoiling = SomeSpoiling(random, recipe);
+    spoiling.disturbance = {};
+    spoiling.claimed = 0;
+    spoiling.shared.reset();
+    const Outcome apart = RunOnce(recipe, spoiling, 0x17, Made::AsSpoilt);
+    Call probe(spoiling.n);
+    Observe({}, 0x17, [&] { return recipe.run(probe); });
+    for (const auto &meeting : probe.pairsOfOneType()) {
+        spoiling.shared = meeting;
+        const Outcome outcome = RunOnce(recipe, spoiling, 0x17, Made::AsSpoilt);
+        if (IsRepeatable(spoiling))
+            CheckRepetition(recipe.exportName().c_str(), outcome,
+                            RunOnce(recipe, spoiling, 0xC2, Made::Otherwise),
+                            "an array for each handle");
+    }
+    return apart;
+}
+
+Outcome RunRecipeHonesty(Random &random, const Recipe &recipe) {
+    RecipeSpoiling spoiling = SomeSpoiling(random, recipe);
+    spoiling.disturbance = {};
+    spoiling.shared.reset();
+    Observed calm;
+    const Outcome granted = RunOnce(recipe, spoiling, 0x17, Made::AsSpoilt, &calm);
+    ForSomeRefusals(random, calm, [&](const Disturbance &disturbance) {
+        spoiling.disturbance = disturbance;
+        const TinyWorkspace workspace(disturbance.workspace);
+        CheckHonesty(recipe.exportName().c_str(), disturbance,
+                     RunOnce(recipe, spoiling, 0x17, Made::AsSpoilt), granted);
+    });
+    return granted;
 }
 
 } // namespace qx::test

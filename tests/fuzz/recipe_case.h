@@ -30,6 +30,10 @@ enum class Made { AsSpoilt, Otherwise };
 void Spoil(Call &call, const RecipeSpoiling &spoiling, Made made = Made::AsSpoilt);
 
 Outcome RunRecipeCase(Random &random, const Recipe &recipe);
+// A call, and with each pair of its arrays as one; while resizes, allocations and the workspace
+// refuse.
+Outcome RunRecipeMeetings(Random &random, const Recipe &recipe);
+Outcome RunRecipeHonesty(Random &random, const Recipe &recipe);
 
 } // namespace qx::test
 

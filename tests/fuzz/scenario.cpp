@@ -101,10 +101,22 @@ bool Scenario::shares() const {
 }
 
 bool Scenario::writesOneTwice() const {
+    const auto isOutput = [this](std::size_t i) { return thunk->parameters[i].isOut; };
+    std::vector<int> writers(arguments.size(), 0); // of the array that each argument is
     for (std::size_t i = 0; i < arguments.size(); ++i) {
         const int other = arguments[i].aliasOf;
-        if (other >= 0 && thunk->parameters[i].isOut &&
-            thunk->parameters[static_cast<std::size_t>(other)].isOut)
+        if (thunk->parameters[i].isArray() && isOutput(i) &&
+            ++writers[other < 0 ? i : static_cast<std::size_t>(other)] > 1)
+            return true;
+    }
+    return false;
+}
+
+bool Scenario::writesInput() const {
+    for (std::size_t i = 0; i < arguments.size(); ++i) {
+        const int other = arguments[i].aliasOf;
+        if (other >= 0 && thunk->parameters[i].isOut !=
+                              thunk->parameters[static_cast<std::size_t>(other)].isOut)
             return true;
     }
     return false;
@@ -141,11 +153,50 @@ Scenario SomeScenario(Random &random, const Thunk &thunk) {
     return scenario;
 }
 
+void *NewArray(const Parameter &parameter, const Argument &argument, const unsigned char *rubbish) {
+    const int32_t rows = parameter.dimensions() == 1 ? argument.cols : argument.rows;
+    void *handle = detail::NewBlock(parameter.dimensions(), TypeCode(parameter.element),
+                                    ElementSize(parameter.element), rows, argument.cols);
+    unsigned char *elements = *static_cast<unsigned char **>(handle) + 4 * parameter.dimensions();
+    if (rubbish != nullptr)
+        std::fill_n(elements, argument.bytes.size(), *rubbish);
+    else if (!argument.bytes.empty())
+        std::memcpy(elements, argument.bytes.data(), argument.bytes.size());
+    return handle;
+}
+
+std::vector<int32_t> SizesOf(void *handle, const Parameter &parameter) {
+    std::vector<int32_t> found(static_cast<std::size_t>(parameter.dimensions()));
+    std::memcpy(found.data(), *static_cast<void **>(handle), 4 * found.size());
+    return found;
+}
+
+const unsigned char *ElementsOf(void *handle, const Parameter &parameter) {
+    return *static_cast<unsigned char **>(handle) + 4 * parameter.dimensions();
+}
+
+std::optional<std::size_t> ElementBytes(void *handle, const Parameter &parameter) {
+    std::size_t count = 1;
+    for (const int32_t size : SizesOf(handle, parameter)) {
+        if (size < 0)
+            return std::nullopt;
+        count *= static_cast<std::size_t>(size);
+    }
+    const std::size_t header = 4 * static_cast<std::size_t>(parameter.dimensions());
+    const std::size_t size = count * ElementSize(parameter.element);
+    if (size > detail::BlockSize(handle) - header)
+        return std::nullopt;
+    return size;
+}
+
 Node::~Node() {
-    for (void *slot : slots)
-        RunSweepOf(slot);
-    if (instance != nullptr && release != nullptr)
-        release(&instance);
+    heap.release([this] {
+        for (void *slot : slots)
+            RunSweepOf(slot);
+        if (instance != nullptr && release != nullptr)
+            release(&instance);
+    });
+    heap.end();
 }
 
 Blocks::Blocks(const Scenario &scenario, const Manner &manner) : scenario_(scenario) {
@@ -155,7 +206,7 @@ Blocks::Blocks(const Scenario &scenario, const Manner &manner) : scenario_(scena
         if (parameter(i).isArray() && argument.aliasOf >= 0 && !manner.apart) {
             handle = handles_[static_cast<std::size_t>(argument.aliasOf)];
         } else if (parameter(i).isArray()) {
-            handle = newArray(parameter(i), argument, isRead(i) ? nullptr : &manner.rubbish);
+            handle = NewArray(parameter(i), argument, isRead(i) ? nullptr : &manner.rubbish);
             own_.push_back(handle);
             claim(handle, parameter(i).dimensions(), argument, manner);
         }
@@ -179,34 +230,6 @@ Blocks::~Blocks() {
         detail::FreeBlock(handle);
 }
 
-unsigned char *Blocks::block(std::size_t i) const {
-    return *static_cast<unsigned char **>(handles_[i]);
-}
-
-std::vector<int32_t> Blocks::sizes(std::size_t i) const {
-    std::vector<int32_t> found(static_cast<std::size_t>(parameter(i).dimensions()));
-    std::memcpy(found.data(), block(i), 4 * found.size());
-    return found;
-}
-
-const unsigned char *Blocks::elements(std::size_t i) const {
-    return block(i) + 4 * parameter(i).dimensions();
-}
-
-std::optional<std::size_t> Blocks::bytes(std::size_t i) const {
-    std::size_t count = 1;
-    for (const int32_t size : sizes(i)) {
-        if (size < 0)
-            return std::nullopt;
-        count *= static_cast<std::size_t>(size);
-    }
-    const std::size_t header = 4 * static_cast<std::size_t>(parameter(i).dimensions());
-    const std::size_t size = count * ElementSize(parameter(i).element);
-    if (size > detail::BlockSize(handles_[i]) - header)
-        return std::nullopt;
-    return size;
-}
-
 bool Blocks::isShared(std::size_t i) const {
     return std::count(handles_.begin(), handles_.end(), handles_[i]) > 1;
 }
@@ -216,19 +239,6 @@ bool Blocks::isRead(std::size_t i) const {
     for (std::size_t other = i + 1; other < scenario_.arguments.size(); ++other)
         reads |= scenario_.arguments[other].aliasOf == static_cast<int>(i) && parameter(other).isIn;
     return reads;
-}
-
-void *Blocks::newArray(const Parameter &parameter, const Argument &argument,
-                       const unsigned char *rubbish) {
-    const int32_t rows = parameter.dimensions() == 1 ? argument.cols : argument.rows;
-    void *handle = detail::NewBlock(parameter.dimensions(), TypeCode(parameter.element),
-                                    ElementSize(parameter.element), rows, argument.cols);
-    unsigned char *elements = *static_cast<unsigned char **>(handle) + 4 * parameter.dimensions();
-    if (rubbish != nullptr)
-        std::fill_n(elements, argument.bytes.size(), *rubbish);
-    else if (!argument.bytes.empty())
-        std::memcpy(elements, argument.bytes.data(), argument.bytes.size());
-    return handle;
 }
 
 PreparedCall::PreparedCall(const Scenario &scenario, Node &node, const Manner &manner)

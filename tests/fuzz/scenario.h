@@ -35,15 +35,26 @@ struct Scenario {
     bool shares() const;
     // Two arrays that the call writes are one, which every export refuses.
     bool writesOneTwice() const;
+    // An array is read in one place and written in another.
+    bool writesInput() const;
     bool saysNegativeSize() const;
 };
 Scenario SomeScenario(Random &random, const Thunk &thunk);
+
+// An array as it is before a call, in a block of the host; with `rubbish` in place of the elements.
+void *NewArray(const Parameter &parameter, const Argument &argument,
+               const unsigned char *rubbish = nullptr);
+std::vector<int32_t> SizesOf(void *handle, const Parameter &parameter);
+const unsigned char *ElementsOf(void *handle, const Parameter &parameter);
+// Of the elements, by the sizes; none where the block has not so many.
+std::optional<std::size_t> ElementBytes(void *handle, const Parameter &parameter);
 
 // The words that a node keeps between its calls.
 struct Node {
     void *slots[4] = {};
     void *instance = nullptr;
     int32_t (*release)(void **) = nullptr;
+    HeapBalance heap;
     ~Node();
 };
 
@@ -65,21 +76,21 @@ public:
     Blocks &operator=(const Blocks &) = delete;
 
     void *handle(std::size_t i) const { return handles_[i]; }
-    std::vector<int32_t> sizes(std::size_t i) const;
-    const unsigned char *elements(std::size_t i) const;
-    // Of the elements, by the sizes; none where the block has not so many.
-    std::optional<std::size_t> bytes(std::size_t i) const;
+    std::vector<int32_t> sizes(std::size_t i) const { return SizesOf(handles_[i], parameter(i)); }
+    const unsigned char *elements(std::size_t i) const {
+        return ElementsOf(handles_[i], parameter(i));
+    }
+    std::optional<std::size_t> bytes(std::size_t i) const {
+        return ElementBytes(handles_[i], parameter(i));
+    }
     bool isShared(std::size_t i) const;
     // Whether its sizes are those from before the call.
     bool saysAsBefore(std::size_t i) const;
 
 private:
     const Parameter &parameter(std::size_t i) const { return scenario_.thunk->parameters[i]; }
-    unsigned char *block(std::size_t i) const;
     bool isRead(std::size_t i) const;
     static void claim(void *handle, int dimensions, const Argument &argument, const Manner &manner);
-    static void *newArray(const Parameter &parameter, const Argument &argument,
-                          const unsigned char *rubbish);
 
     const Scenario &scenario_;
     std::vector<void *> handles_, own_;

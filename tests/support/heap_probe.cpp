@@ -1,5 +1,6 @@
 #include "tests/support/heap_probe.h"
 
+#include <algorithm>
 #include <cerrno>
 #include <cstddef>
 #include <cstring>
@@ -30,6 +31,7 @@ struct Watch {
     void (*hook)(); // in place of a failure
     int32_t refusals;
     int fresh; // what new blocks hold; negative for anything
+    int64_t liveBytes, peakBytes;
 };
 // Of the initial-exec kind, so that reading it never allocates.
 __attribute__((tls_model("initial-exec"))) thread_local Watch watch;
@@ -37,15 +39,16 @@ __attribute__((tls_model("initial-exec"))) thread_local Watch watch;
 } // namespace
 
 HeapProbe::HeapProbe(int32_t failAt, std::size_t largest, int fresh) {
-    watch = {true, failAt, largest, 0, 0, nullptr, 0, fresh};
+    watch = {true, failAt, largest, 0, 0, nullptr, 0, fresh, 0, 0};
 }
 HeapProbe::HeapProbe(int32_t hookAt, void (*hook)()) {
-    watch = {true, hookAt, std::numeric_limits<std::size_t>::max(), 0, 0, hook, 0, -1};
+    watch = {true, hookAt, std::numeric_limits<std::size_t>::max(), 0, 0, hook, 0, -1, 0, 0};
 }
 HeapProbe::~HeapProbe() { watch.on = false; }
 int32_t HeapProbe::allocations() const { return watch.allocations; }
 int32_t HeapProbe::liveAllocations() const { return watch.live; }
 int32_t HeapProbe::refusals() const { return watch.refusals; }
+int64_t HeapProbe::peakBytes() const { return watch.peakBytes; }
 HeapProbe::Pause::Pause() : wasWatching_(watch.on) { watch.on = false; }
 HeapProbe::Pause::~Pause() { watch.on = wasWatching_; }
 
@@ -72,9 +75,19 @@ bool Refuses(std::size_t size) {
     return false;
 }
 
+// Counts bytes that are taken, or with a negative number given back.
+void CountBytes(int64_t bytes) {
+    watch.liveBytes += bytes;
+    watch.peakBytes = std::max(watch.peakBytes, watch.liveBytes);
+}
+
+int64_t BytesOf(void *block) { return static_cast<int64_t>(malloc_usable_size(block)); }
+
 void *Granted(void *block) {
-    if (watch.on && block != nullptr)
+    if (watch.on && block != nullptr) {
         ++watch.live;
+        CountBytes(BytesOf(block));
+    }
     if (watch.on && block == nullptr)
         ++watch.refusals;
     return block;
@@ -119,11 +132,17 @@ __attribute__((visibility("default"))) void *realloc(void *block, std::size_t si
         return nullptr;
     const std::size_t before = block == nullptr ? 0 : malloc_usable_size(block);
     void *grown = qx::test::Fresh(__libc_realloc(block, size), before);
-    return block == nullptr ? qx::test::Granted(grown) : grown;
+    if (block == nullptr)
+        return qx::test::Granted(grown);
+    if (qx::test::watch.on && grown != nullptr)
+        qx::test::CountBytes(qx::test::BytesOf(grown) - static_cast<int64_t>(before));
+    return grown;
 }
 __attribute__((visibility("default"))) void free(void *block) {
-    if (qx::test::watch.on && block != nullptr)
+    if (qx::test::watch.on && block != nullptr) {
         --qx::test::watch.live;
+        qx::test::CountBytes(-qx::test::BytesOf(block));
+    }
     __libc_free(block);
 }
 }

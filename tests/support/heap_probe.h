@@ -28,6 +28,7 @@ public:
     int32_t allocations() const;     // malloc, calloc and realloc, failed ones included
     int32_t liveAllocations() const; // allocations less frees
     int32_t refusals() const;        // those that failed
+    int64_t peakBytes() const;       // the most that was held at one time
 
     // While one exists, heap calls are not watched: the host's own.
     class Pause {

@@ -11,12 +11,22 @@
 #include <mutex>
 #include <stdexcept>
 
+#if defined(__SANITIZE_ADDRESS__)
+#define QX_TEST_POISONS 1
+#elif defined(__has_feature)
+#if __has_feature(address_sanitizer)
+#define QX_TEST_POISONS 1
+#endif
+#endif
+#ifdef QX_TEST_POISONS
+#include <sanitizer/asan_interface.h>
+#endif
+
 namespace qx::test {
 
 namespace {
 
 constexpr std::size_t guardSize = 64;
-constexpr unsigned char guardByte = 0xFD;
 constexpr unsigned char deadByte = 0xDE;
 constexpr std::size_t quarantineLimit = 64;
 
@@ -25,12 +35,31 @@ struct Block {
     std::size_t size;      // header and elements
     int32_t numDims;
     int32_t typeCode; // of its elements
+    unsigned char guard;
     unsigned char *payload() const { return memory + guardSize; }
+    unsigned char *end() const { return payload() + size; }
 };
+
+// What a guard reads as differs with what fresh blocks hold, so that a call which reads beyond a
+// block has another result then.
+unsigned char GuardByte() { return Host().freshByte ^ 0x58; }
+
+#ifdef QX_TEST_POISONS
+void Forbid(const unsigned char *bytes, std::size_t count) {
+    ASAN_POISON_MEMORY_REGION(bytes, count);
+}
+void Allow(const unsigned char *bytes, std::size_t count) {
+    ASAN_UNPOISON_MEMORY_REGION(bytes, count);
+}
+#else
+void Forbid(const unsigned char *, std::size_t) {}
+void Allow(const unsigned char *, std::size_t) {}
+#endif
 
 struct Registry {
     std::recursive_mutex lock;
     std::deque<HostRecord> records; // of all threads there have been
+    std::vector<HostRecord *> left; // of those that need none any more
     std::map<void *, Block> live;   // by handle
     std::deque<Block> quarantine;   // poisoned
     std::map<std::pair<SweepProcedure, void *>, int32_t> sweeps;
@@ -47,27 +76,32 @@ Block Allocate(std::size_t size, int32_t numDims, int32_t typeCode) {
     auto *memory = static_cast<unsigned char *>(std::malloc(whole + 16));
     if (memory == nullptr)
         throw std::bad_alloc();
-    std::memset(memory, guardByte, guardSize);
-    std::memset(memory + guardSize, Host().freshByte, size);
-    std::memset(memory + guardSize + size, guardByte, guardSize);
-    return {memory, size, numDims, typeCode};
+    const Block block = {memory, size, numDims, typeCode, GuardByte()};
+    std::memset(memory, block.guard, guardSize);
+    std::memset(block.payload(), Host().freshByte, size);
+    std::memset(block.end(), block.guard, guardSize);
+    Forbid(memory, guardSize);
+    Forbid(block.end(), guardSize);
+    return block;
 }
 
 void Expect(const unsigned char *bytes, std::size_t count, unsigned char value, const char *what) {
-    for (std::size_t i = 0; i < count; ++i)
-        if (bytes[i] != value)
-            throw std::logic_error(what);
+    Allow(bytes, count);
+    // All are as the first one where each is as the next one.
+    if (count > 0 && (bytes[0] != value || std::memcmp(bytes, bytes + 1, count - 1) != 0))
+        throw std::logic_error(what);
+    Forbid(bytes, count);
 }
 
 void CheckGuards(const Block &block) {
-    Expect(block.memory, guardSize, guardByte, "a write before the start of a host block");
-    Expect(block.payload() + block.size, guardSize, guardByte,
-           "a write past the end of a host block");
+    Expect(block.memory, guardSize, block.guard, "a write before the start of a host block");
+    Expect(block.end(), guardSize, block.guard, "a write past the end of a host block");
 }
 
 void Quarantine(Registry &registry, Block block) {
     CheckGuards(block);
     std::memset(block.payload(), deadByte, block.size);
+    Forbid(block.payload(), block.size);
     registry.quarantine.push_back(block);
     if (registry.quarantine.size() > quarantineLimit) {
         const Block oldest = registry.quarantine.front();
@@ -105,14 +139,27 @@ bool IsCodeOf(const Block &block, int32_t typeCode, int32_t count) {
 // Nothing that is thread_local may have a destructor: on 32-bit Windows the run-time of the
 // compiler frees the memory of such objects before it destroys them, so a destructor would free
 // whatever stands there by then. The records therefore stay to the end of the process.
+namespace {
+thread_local HostRecord *threadsRecord = nullptr;
+}
+
 HostRecord &Host() {
-    thread_local HostRecord *record = nullptr;
-    if (record == nullptr) {
+    if (threadsRecord == nullptr) {
         const HeapProbe::Pause pause;
-        const std::lock_guard hold(Blocks().lock);
-        record = &Blocks().records.emplace_back();
+        Registry &registry = Blocks();
+        const std::lock_guard hold(registry.lock);
+        if (registry.left.empty())
+            registry.left.push_back(&registry.records.emplace_back());
+        threadsRecord = registry.left.back();
+        registry.left.pop_back();
     }
-    return *record;
+    return *threadsRecord;
+}
+
+void LeaveHost() {
+    ResetHost();
+    const std::lock_guard hold(Blocks().lock);
+    Blocks().left.push_back(std::exchange(threadsRecord, nullptr));
 }
 
 void ResetHost(int32_t failAt, int32_t failStatus) {
@@ -160,6 +207,15 @@ void CheckBlocks() {
         Expect(block.payload(), block.size, deadByte, "a write to a block that has moved");
 }
 
+void ForgetMovedBlocks() {
+    const std::lock_guard hold(Blocks().lock);
+    CheckBlocks();
+    for (const Block &block : Blocks().quarantine)
+        std::free(block.memory);
+    Blocks().quarantine.clear();
+    Blocks().quarantine.shrink_to_fit();
+}
+
 int LiveBlocks() {
     const std::lock_guard hold(Blocks().lock);
     return static_cast<int>(Blocks().live.size());
@@ -199,6 +255,8 @@ int32_t ReshapeBlock(int32_t typeCode, int32_t numDims, void *handleAddress, int
     const HeapProbe::Pause pause;
     HostRecord &record = Host();
     record.reshapes.push_back({typeCode, numDims, count});
+    if (record.atReshape)
+        record.atReshape();
     if (record.failAt != 0 && static_cast<int32_t>(record.reshapes.size()) == record.failAt)
         return record.failStatus;
 

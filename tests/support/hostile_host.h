@@ -5,6 +5,7 @@
 #include "qx/errors.h"
 
 #include <cstdint>
+#include <functional>
 #include <initializer_list>
 #include <utility>
 #include <vector>
@@ -12,8 +13,8 @@
 // A host that a careless frame does not survive. It is part of the test program, which exports
 // the names that the module looks for. Every successful reshape moves the block, poisons the old
 // one and keeps it for a while to see whether anybody still writes there; both ends of every
-// block are guarded; elements of 1-D blocks stand at 4 modulo 16; new bytes hold a pattern that
-// no result looks like.
+// block are guarded, for the address sanitizer against reading, too; elements of 1-D blocks stand
+// at 4 modulo 16; new bytes hold a pattern that no result looks like.
 
 namespace qx::test {
 
@@ -33,10 +34,15 @@ struct HostRecord {
     // More is refused, with the status of a host that has no memory: by default more than any test
     // needs, so that absurd requests are not granted lazily.
     std::size_t largestBlock = std::size_t{1} << 30;
-    // What the bytes of a new block hold: as doubles about -1e-128, as int32 about -1.5e9.
+    // What the bytes of a new block hold: as doubles about -1e-128, as int32 about -1.5e9. Its
+    // guards hold another byte, which follows from this one.
     unsigned char freshByte = 0xA5;
+    // What happens in the host before each reshape.
+    std::function<void()> atReshape = nullptr;
 };
 HostRecord &Host();
+// The calling thread makes no more calls; its record is another's from here on.
+void LeaveHost();
 constexpr int32_t everyReshape = -1; // as `failAt`
 constexpr int32_t statusNoMemory = 2;
 // Forgets the calling thread's record and sets which reshape fails.
@@ -51,6 +57,8 @@ int RegisteredSweeps();
 
 // Throws if a guard or a poisoned byte has changed since; called by every reshape and free too.
 void CheckBlocks();
+// Checks, and gives back what is kept of blocks that have moved.
+void ForgetMovedBlocks();
 int LiveBlocks();
 
 // Elements with the alignment of their C++ type, for values on their own.

@@ -145,15 +145,23 @@ int32_t *Call::integer(int number) {
 
 void **Call::slot(int number) {
     const HeapProbe::Pause pause;
-    return &slots_.emplace(number, preset_).first->second;
+    return &node_->slots.emplace(number, preset_).first->second;
+}
+
+void **Call::instance(int32_t (*release)(void **)) {
+    if (node_ == &own_)
+        node_->instance = preset_;
+    if (node_->instance == nullptr) // else the word ends as whoever filled it has it
+        node_->releaseInstance = release;
+    return &node_->instance;
 }
 
 std::vector<void *> Call::words() const {
     std::vector<void *> found;
-    for (const auto &[number, slot] : slots_)
+    for (const auto &[number, slot] : node_->slots)
         found.push_back(slot);
-    if (releaseInstance_ != nullptr)
-        found.push_back(instance_);
+    if (node_->releaseInstance != nullptr)
+        found.push_back(node_->instance);
     return found;
 }
 
@@ -336,12 +344,12 @@ std::string Call::describeOutputs() const {
     return text.str();
 }
 
-void Call::releaseNodes() {
-    for (auto &[number, slot] : slots_)
-        if (slot != preset_)
+void NodeWords::release(const void *anothers) {
+    for (auto &[number, slot] : slots)
+        if (slot != anothers)
             RunSweepOf(std::exchange(slot, nullptr));
-    if (instance_ != nullptr && instance_ != preset_)
-        releaseInstance_(&instance_);
+    if (instance != nullptr && instance != anothers)
+        releaseInstance(&instance);
 }
 
 } // namespace qx::test

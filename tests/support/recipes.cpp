@@ -1,6 +1,9 @@
 #include "tests/support/recipe.h"
 
 #include <algorithm>
+#include <cstdio>
+#include <fstream>
+#include <stdexcept>
 
 namespace qx::test {
 
@@ -38,6 +41,21 @@ const std::vector<Recipe> &AllRecipes() {
 }
 
 const std::vector<Exempt> &ExemptExports() { return Registered().exempt; }
+
+std::map<std::string, std::string> AcceptedHashes(const char *file) {
+    std::map<std::string, std::string> accepted;
+    std::ifstream lines(file);
+    for (std::string name, hash; lines >> name >> hash;)
+        if (!accepted.emplace(name, hash).second)
+            throw std::logic_error(name + " stands twice in " + file);
+    return accepted;
+}
+
+std::string HashText(uint64_t hash) {
+    char text[17];
+    std::snprintf(text, sizeof text, "%016llx", static_cast<unsigned long long>(hash));
+    return text;
+}
 
 std::map<std::string, uint64_t> HashEveryExport(const Caller &caller) {
     std::map<std::string, uint64_t> hashes;

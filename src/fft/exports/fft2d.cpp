@@ -9,7 +9,7 @@ namespace {
 
 // The plan of the rows' length stands first in a node's two slots.
 template <class Keep>
-ErrorCode AcquirePlans(Keep keep, int32_t rows, int32_t cols) {
+ErrorCode AcquirePlans(Keep &keep, int32_t rows, int32_t cols) {
     const ErrorCode failed = keep.acquire(cols);
     return failed ? failed : keep.acquireSecond(rows);
 }

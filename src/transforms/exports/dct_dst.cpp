@@ -66,7 +66,7 @@ Outcome Inverse(In<DBL1D> in, Out<DBL1D> out, Keep keep) {
 
 // Both plans and the output, in the order of the transform.
 template <class Transform, class Keep>
-Outcome TakePlansAndReshape(Keep keep, Out<DBL2D> &out, int32_t rows, int32_t cols) {
+Outcome TakePlansAndReshape(Keep &keep, Out<DBL2D> &out, int32_t rows, int32_t cols) {
     if (!Transform::plansBeforeReshape)
         if (const Outcome bad = out.resize(rows, cols))
             return bad;
