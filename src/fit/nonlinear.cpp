@@ -105,6 +105,13 @@ public:
         return 0;
     }
 
+    // The weighted length of y.
+    double sizeOfY() const {
+        double squares = 0.0;
+        for (int32_t i = 0; i < n_; ++i)
+            squares += root(i) * fit_.y[i] * (root(i) * fit_.y[i]);
+        return std::sqrt(squares);
+    }
     bool hasDerivatives() const { return fit_.model.jacobian != nullptr; }
 
 private:
@@ -255,6 +262,7 @@ private:
             scale_[j] = 0.0;
         }
         model_.setTypical(here_.p);
+        sizeOfY_ = model_.sizeOfY();
         if (const ErrorCode failed = model_.evaluate(here_))
             return failed;
         if (here_.cost == kInfinity)
@@ -301,13 +309,16 @@ private:
         return model_.evaluate(there_);
     }
 
-    // By what part of itself, or of what it may be off by, the step moves a parameter at most.
+    // By what part of itself the step moves a parameter at most. One that hardly matters counts as
+    // large as what would change the model by a millionth of y: it may well be 0.
     double largestMove() const {
         double largest = 0.0;
         for (int32_t j = 0; j < k_; ++j) {
-            const double s = std::fabs(move_.step[j]), size = std::fabs(here_.p[j]);
+            const double s = std::fabs(move_.step[j]);
+            const double least = lengths_[j] > 0.0 ? 1e-6 * sizeOfY_ / lengths_[j] : 0.0;
+            const double size = std::max(std::fabs(here_.p[j]), least);
             if (s > 0.0)
-                largest = std::max(largest, s > size * largestNumber ? kInfinity : s / size);
+                largest = std::max(largest, s / size);
         }
         return largest;
     }
@@ -376,7 +387,6 @@ private:
             if (const ErrorCode failed = tryStep(kInfinity))
                 return failed;
             const double move = largestMove(), length = move_.length;
-            lastMove_ = move;
             const bool isWorse = !(there_.cost <= here_.cost * (1.0 + 1e-6) + 0x1p-1000) ||
                                  !(length < 0.7 * before);
             if (isWorse || length == 0.0 || !(move < 1e-2))
@@ -417,7 +427,7 @@ private:
         const bool isDetermined = hasFullRank(columns);
         if (!result->covariance.isEmpty())
             writeCovariance(columns, isDetermined, result->covariance);
-        result->end = endOf(columns, isDetermined);
+        result->end = endOf(isDetermined);
         return 0;
     }
 
@@ -447,20 +457,19 @@ private:
             }
     }
 
-    FitEnd endOf(const ScaledColumns &, bool isDetermined) {
-        if (end_ == FitEnd::Exact || (here_.cost == 0.0))
-            return FitEnd::Exact;
-        if (!isAtRest_)
+    FitEnd endOf(bool isDetermined) {
+        if (end_ != FitEnd::Exact && here_.cost > 0.0 && !isAtRest_)
             return FitEnd::Limit;
         if (!isDetermined)
             return FitEnd::Undetermined;
+        if (here_.cost == 0.0)
+            return FitEnd::Exact;
         move_.find({r_, z_}, lengths_, lowest_, highest_, kInfinity);
         return largestMove() <= claimedDigits ? FitEnd::Converged : FitEnd::NoLowerCost;
     }
 
     static constexpr double firstRadius = 1.0;
     static constexpr double noise = 1e-12;
-    static constexpr double largestNumber = 0x1p900;
     static constexpr int mostPolishing = 40;
 
     const NonlinearFit &fit_;
@@ -470,7 +479,7 @@ private:
     RealMatrix r_;
     RealVector z_, scale_, lengths_, lowest_, highest_;
     TrustRegionStep move_;
-    double radius_ = 0.0, lastMove_ = kInfinity;
+    double radius_ = 0.0, sizeOfY_ = 0.0;
     int32_t iterations_ = 0;
     FitEnd end_ = FitEnd::Limit;
     bool isAtRest_ = false;

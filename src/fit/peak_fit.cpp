@@ -3,7 +3,9 @@
 #include "fit/bounded_frame.h"
 #include "fit/models.h"
 #include "fit/peak_search.h"
+#include "frame/constants.h"
 #include "linalg/matrix.h"
+#include "stats/order.h"
 
 #include <algorithm>
 #include <cmath>
@@ -88,16 +90,17 @@ private:
     // The best start goes all the way, and those that lead elsewhere some steps: on if they are
     // ahead then.
     ErrorCode race(const PeakSearch &search, FoundPeak *best) const {
-        constexpr int32_t enough = 6, most = 24, firstSteps = 12;
+        constexpr int32_t enough = 6, enoughOfSign = 3, most = 24, firstSteps = 12;
         constexpr double exact = 1e-24;
-        int32_t tried = 0;
+        int32_t tried[2] = {}; // peaks and dips
         for (int32_t i = 0; i < search.count(); ++i) {
             const PeakStart &start = search[i];
-            const bool isDone = best->isAtRest() &&
-                                (best->cost <= exact * search.squares() || tried >= enough);
-            if (isDone || tried >= most)
+            const int32_t sum = tried[0] + tried[1];
+            int32_t &alike = tried[start.a < 0.0];
+            if ((best->isAtRest() && best->cost <= exact * search.squares()) || sum >= most)
                 break;
-            if (best->isAtRest() && best->explains(start))
+            if (best->isAtRest() &&
+                (best->explains(start) || (sum >= enough && alike >= enoughOfSign)))
                 continue;
             FoundPeak found;
             const bool isFirst = best->cost == kInfinity;
@@ -108,7 +111,7 @@ private:
                                  limit_ - firstSteps, &found);
             if (failed == ErrOutOfMemory)
                 return failed;
-            ++tried;
+            ++alike;
             if (failed == 0 && found.isBetterThan(*best))
                 *best = found;
         }
@@ -189,26 +192,127 @@ ErrorCode Repeat(const FitSamples &given, ScratchParts &memory, FitSamples *samp
     return 0;
 }
 
-// From the least squares on, in another norm; bisquare from the least absolute residuals.
-ErrorCode FitRobustly(const BoundedFit &request, FitSamples samples) {
-    ScratchParts copies;
+typedef VectorView<ElementType::I32> Places;
+
+// The samples in ascending order of x, by merging runs of twice the length each time.
+void OrderBy(ConstRealVector x, Places order, Places merged) {
+    const std::ptrdiff_t n = x.size();
+    for (std::ptrdiff_t i = 0; i < n; ++i)
+        order[i] = static_cast<int32_t>(i);
+    for (std::ptrdiff_t run = 1; run < n; run *= 2) {
+        for (std::ptrdiff_t from = 0; from < n; from += 2 * run) {
+            const std::ptrdiff_t middle = std::min(from + run, n), end = std::min(middle + run, n);
+            std::ptrdiff_t left = from, right = middle;
+            for (std::ptrdiff_t k = from; k < end; ++k) {
+                const bool takesLeft =
+                    right >= end || (left < middle && x[order[left]] <= x[order[right]]);
+                merged[k] = order[takesLeft ? left++ : right++];
+            }
+        }
+        std::swap(order, merged);
+    }
+    for (std::ptrdiff_t i = 0; i < n; ++i)
+        merged[i] = order[i]; // whichever of both is the caller's
+}
+
+// Medians of each five neighbours, for a start that lone outliers do not decide.
+ErrorCode SmoothByMedians(const FitSamples &samples, RealVector smooth) {
+    constexpr int32_t reach = 2;
+    const int32_t n = samples.n();
+    Places order, spare;
+    ScratchParts memory;
+    if (const ErrorCode failed = memory.take(Sized(order, n), Sized(spare, n)))
+        return failed;
+    OrderBy(samples.x, order, spare);
+    for (int32_t k = 0; k < n; ++k) {
+        double window[2 * reach + 1];
+        int32_t size = 0;
+        for (int32_t i = std::max(k - reach, 0); i <= std::min(k + reach, n - 1); ++i) {
+            int32_t at = size++;
+            for (; at > 0 && window[at - 1] > samples.y[order[i]]; --at)
+                window[at] = window[at - 1];
+            window[at] = samples.y[order[i]];
+        }
+        smooth[order[k]] = window[size / 2];
+    }
+    return 0;
+}
+
+// The least squares of the samples, with the sign of s that the bounds want.
+ErrorCode LeastSquaresPeak(const BoundedFit &request, const FitSamples &samples, FoundPeak *peak) {
+    if (const ErrorCode failed = PeakFit(request, samples).run(peak))
+        return failed;
+    if (request.bounds.upper[2] <= 0.0)
+        peak->p[2] = -peak->p[2];
+    return 0;
+}
+
+// On from a peak in another norm.
+ErrorCode FollowNorm(FitNorm norm, const BoundedFit &request, const FitSamples &samples,
+                     FoundPeak *peak) {
+    int32_t iterations = *request.iterations > 0 ? *request.iterations : 2000;
+    double lambda = 0.1;
+    const ErrorCode status =
+        BoundedLM(FitModelOf<GaussianModel>(), samples, norm, request.bounds, peak->p, &iterations,
+                  ToleranceOrDefault(request.tolerance), &lambda, &peak->cost);
+    peak->iterations += iterations;
+    peak->end = FitEnd::Converged;
+    return status == ErrIterationLimit ? 0 : status;
+}
+
+// By least absolute residuals, and by bisquare from there.
+ErrorCode FollowNorms(const BoundedFit &request, const FitSamples &samples, FoundPeak *peak) {
+    if (const ErrorCode failed = FollowNorm(leastAbsolute, request, samples, peak))
+        return failed;
+    return request.method == bisquare ? FollowNorm(bisquare, request, samples, peak) : 0;
+}
+
+// By what peaks in a robust norm are compared: the sum of the residuals, or for bisquare, whose
+// weights differ, their median (P. J. Rousseeuw, "Least median of squares regression", 1984).
+ErrorCode RobustCost(const BoundedFit &request, const FitSamples &samples, const FoundPeak &peak,
+                     RealVector residuals, double *cost) {
+    *cost = peak.cost;
+    if (request.method != bisquare)
+        return 0;
+    for (int32_t i = 0; i < samples.n(); ++i)
+        residuals[i] =
+            std::fabs(samples.y[i] - GaussianModel::value(samples.x[i], peak.p, nullptr));
+    DBL median;
+    const ErrorCode failed = ArrayMedian(residuals, &median);
+    *cost = median;
+    return failed;
+}
+
+// From the least squares of the samples, and of their medians, where lone outliers do not show.
+ErrorCode FitRobustly(const BoundedFit &request, FitSamples samples, FoundPeak *best) {
+    ScratchParts copies, memory;
     if (samples.n() < count)
         if (const ErrorCode failed = Repeat(samples, copies, &samples))
             return failed;
-    const int32_t limit = *request.iterations > 0 ? *request.iterations : 2000;
-    int32_t steps = 0;
-    for (int32_t norm = leastAbsolute; norm <= request.method; ++norm) {
-        int32_t iterations = limit;
-        double lambda = 0.1;
-        const ErrorCode status = BoundedLM(FitModelOf<GaussianModel>(), samples, norm,
-                                           request.bounds, request.p, &iterations,
-                                           ToleranceOrDefault(request.tolerance), &lambda, request.mse);
-        if (status != 0 && status != ErrIterationLimit)
-            return status;
-        steps = StepsOfBoth(steps, iterations);
+    RealVector smooth, residuals;
+    if (const ErrorCode failed = memory.take(Sized(smooth, samples.n()), Sized(residuals, samples.n())))
+        return failed;
+    if (const ErrorCode failed = SmoothByMedians(samples, smooth))
+        return failed;
+    ErrorCode status = ErrNoUsableFit;
+    double least = kInfinity;
+    for (const bool isSmooth : {false, true}) {
+        FoundPeak peak;
+        const ConstRealVector y = isSmooth ? ConstRealVector(smooth) : samples.y;
+        double cost = kInfinity;
+        ErrorCode failed = LeastSquaresPeak(request, {samples.x, y, samples.w}, &peak);
+        if (failed == 0)
+            failed = FollowNorms(request, samples, &peak);
+        if (failed == 0)
+            failed = RobustCost(request, samples, peak, residuals, &cost);
+        if (failed == ErrOutOfMemory)
+            return failed;
+        status = status == 0 ? 0 : failed;
+        if (cost < least || best->cost == kInfinity)
+            *best = peak;
+        least = std::min(least, cost);
     }
-    *request.iterations = steps;
-    return 0;
+    return status;
 }
 
 } // namespace
@@ -226,18 +330,15 @@ ErrorCode FitPeak(const BoundedFit &request, FitEnd *end) {
         return 0;
     }
     FoundPeak best;
-    if (const ErrorCode failed = PeakFit(request, samples).run(&best))
+    const bool isSquares = request.method == leastSquares;
+    if (const ErrorCode failed = isSquares ? LeastSquaresPeak(request, samples, &best)
+                                           : FitRobustly(request, samples, &best))
         return failed;
     for (int32_t j = 0; j < count; ++j)
-        request.p[j] = j == 2 && request.bounds.upper[2] <= 0.0 ? -best.p[j] : double{best.p[j]};
-    if (request.method == leastSquares) {
-        *request.mse = 2.0 * best.cost / samples.n();
-        *request.iterations = best.iterations;
-        *end = best.end;
-    } else if (const ErrorCode failed = FitRobustly(request, samples)) {
-        return failed;
-    }
-    request.p[2] = std::fabs(request.p[2]);
+        request.p[j] = j == 2 ? std::fabs(best.p[j]) : double{best.p[j]};
+    *request.mse = isSquares ? 2.0 * best.cost / samples.n() : best.cost;
+    *request.iterations = best.iterations;
+    *end = best.end;
     for (int32_t i = 0; i < samples.n(); ++i)
         request.values[i] = GaussianModel::value(request.samples.x[i], request.p, nullptr);
     return 0;

@@ -94,10 +94,11 @@ void PeakSearch::searchLevel(const Level &level, double widthsPerScale) {
     const double origin = first_ + 0.5 * (level.width - finest_.width);
     const auto bins = static_cast<int32_t>(level.weights.size());
     const double lowest = bounds_.lower[1], highest = bounds_.upper[1];
-    PeakStart best = {};
-    best.rest = kInfinity;
+    PeakStart peak = {}, dip = {};
+    peak.rest = dip.rest = kInfinity;
     const auto consider = [&](const ShapeSums &sums, double m) {
         const PeakStart start = bestHeight(sums, m, s);
+        PeakStart &best = start.a < 0.0 ? dip : peak;
         if (start.rest < best.rest)
             best = start;
     };
@@ -125,8 +126,8 @@ void PeakSearch::searchLevel(const Level &level, double widthsPerScale) {
     for (const double bound : {lowest, highest})
         if (std::fabs(bound) < kInfinity)
             consider(sumsAt(level, bound, s), bound);
-    if (best.rest < kInfinity)
-        keep(best);
+    keep(peak);
+    keep(dip);
 }
 
 PeakSearch::ShapeSums PeakSearch::sumsOnBin(const Level &level, int32_t bin) const {
@@ -198,7 +199,7 @@ PeakStart PeakSearch::bestHeight(const ShapeSums &sums, double m, double s) cons
 }
 
 void PeakSearch::keep(const PeakStart &start) {
-    if (count_ < mostStarts && std::isfinite(start.a) && std::isfinite(start.c))
+    if (count_ < mostStarts && start.rest < kInfinity)
         starts_[count_++] = start;
 }
 

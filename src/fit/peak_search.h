@@ -16,8 +16,8 @@ struct PeakStart {
 // until 64 are left. At each width the peaks that are some bins wide are placed on every bin, and
 // beyond the ends, and at the last one wider ones, too; a and c are the best within their bounds, in closed form, since the model is
 // linear in them (G. H. Golub, V. Pereyra, "The differentiation of pseudo-inverses and nonlinear
-// least squares problems whose variables separate", 1973). The best place of each scale is a
-// start, and so are the highest and the lowest sample with the width that is seen there. They come
+// least squares problems whose variables separate", 1973). The best peak and the best dip
+// of each scale are starts, and so are the highest and the lowest sample with the width that is seen there. They come
 // best first. The work is in proportion to the samples.
 class PeakSearch {
 public:
@@ -32,7 +32,7 @@ public:
     const PeakStart &operator[](int32_t i) const { return starts_[i]; }
 
 private:
-    static constexpr int32_t mostStarts = 64, fewestBins = 64;
+    static constexpr int32_t mostStarts = 96, fewestBins = 64;
     // Bins from the middle of the widest peak to the farthest bin.
     static constexpr int32_t widest = 25 * fewestBins;
     struct Level {

@@ -67,20 +67,6 @@ ErrorCode CheckSamples(In<DBL1D> y, In<DBL1D> w, In<DBL1D> guess, int32_t free) 
 
 bool IsOfSize(In<DBL1D> bounds, int32_t count) { return bounds.isEmpty() || bounds.size() == count; }
 
-// The code of an end; the limit leaves the results where they are.
-Outcome OutcomeOf(FitEnd end) {
-    switch (end) {
-    case FitEnd::Limit:
-        return Outcome::WithResults(ErrIterationLimit);
-    case FitEnd::Undetermined:
-        return WarnRankDeficient;
-    case FitEnd::NoLowerCost:
-        return WarnLowAccuracy;
-    default:
-        return 0;
-    }
-}
-
 Outcome FitCallersModel(In<DBL1D> x, In<DBL1D> y, In<DBL1D> w, FitProcedure model,
                         FitProcedure jacobian, void *context, In<DBL1D> guess, In<DBL1D> lower,
                         In<DBL1D> upper, int32_t loss, double scale, double tolerance,

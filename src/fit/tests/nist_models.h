@@ -254,7 +254,7 @@ struct NistProblem {
     }
     // By the trust region, with derivatives or by differences.
     NonlinearResult fit(int start, bool withDerivatives, std::vector<double> *parameters,
-                        double tolerance = 0.0) const {
+                        double tolerance = 0.0, const RealMatrix &covariance = {}) const {
         const auto values = [](const void *user, const DBL *p, DBL *out) {
             const NistProblem &self = *static_cast<const NistProblem *>(user);
             const std::vector<double> b(p, p + self.set.certified.size());
@@ -285,9 +285,18 @@ struct NistProblem {
         std::vector<DBL> p(set.starts[start].begin(), set.starts[start].end());
         NonlinearResult result;
         result.p = {p.data(), static_cast<std::ptrdiff_t>(p.size())};
+        result.covariance = covariance;
         FitNonlinear(request, &result);
         parameters->assign(p.begin(), p.end());
         return result;
+    }
+    double squares(const std::vector<double> &p) const {
+        double sum = 0;
+        for (std::size_t i = 0; i < target.size(); ++i) {
+            const double r = target[i] - functions.value(set.x[i], set.second[i], p.data());
+            sum += r * r;
+        }
+        return sum;
     }
     // The digits to which all parameters agree with the certified ones, of the 11 that there are.
     double digits(const std::vector<double> &p) const {
