@@ -139,7 +139,7 @@ QX_API ErrorCode BoundLogFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w
     without its sign. Bounds of bad length are left out without a word, and so is a guess that does
     not begin with a finite value. Without a guess the fit starts at the peak on the lowest level of
     the data or at the dip in the highest: of 510 exact peaks and dips of all widths, within bounds
-    that hold them, @ELDER@ are missed, with the code 0 or a failure. BoundGaussianFit2026_head finds
+    that hold them, 90 are missed, with the code 0 or a failure. BoundGaussianFit2026_head finds
     all of them. Codes: ErrSizeMismatch (x or w does not fit y),
     ErrNaNInData (a bound is NaN), ErrFitPointsTooFew (fewer samples than free coefficients),
     ErrOutOfMemory (no memory), ErrInvalidSelector (method is above 2), ErrNonFiniteInput (a weight

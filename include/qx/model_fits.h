@@ -109,7 +109,7 @@ QX_API ErrorCode LogFitCoef_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, do
     may creep on for millions of trials, up to the limit. x from 1e154 on overflow: s is infinite,
     with the code 0. A guess that is not finite counts as none. A peak that alone lies above a tenth
     of its height is taken through three points, and *iterations is 0. Of 510 exact peaks and dips of
-    all widths @ELDERP@ are missed by more than 1e-6 of a coefficient; GaussianPeakFit2026_head finds
+    all widths 242 are missed by more than 1e-6 of a coefficient; GaussianPeakFit2026_head finds
     all of them.
     Codes: ErrSizeMismatch (the arrays differ in length), ErrFewerThanThree (less than three
     samples), ErrNonFiniteInput (a weight is NaN), ErrTooFewWeights (less than three weights are not

@@ -670,6 +670,10 @@ def gaussian(x: ArrayLike, y: ArrayLike, sigma: ArrayLike | None = None, offset:
     {'a': 2.0, 'm': 1.0, 's': 0.5, 'c': 1.0}
     """
     x, y, w = _samples("gaussian", x, y, sigma)
+    if not offset and not bounds and method == "least squares":
+        start = _limits("gaussian", "ams", None, guess, {})[2]
+        p = core.gaussian_peak(y, x, w, TOLERANCE, start, ITERATIONS, 0.0)[1:4]
+        return _finished(_gaussian(False), x, y, w, p)
     return _bounded("gaussian", lambda y, x, w, start, lower, upper, code: core.gaussian(
         y, x, w, TOLERANCE, ITERATIONS, start, lower, upper, code)[2:6], _gaussian(bool(offset)), x, y, w,
         bounds, guess, method, {} if offset else {"c": 0.0})

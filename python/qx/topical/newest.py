@@ -174,7 +174,7 @@ NEWEST = {
         "line": "BoundLinearFit_head", "line_absolute": "BoundLinearFitLAR_head",
         "line_bisquare": "BoundLinearFitBi_head", "polynomial": "PolyFit81_head",
         "exponential": "BoundExpFit_head", "power": "BoundPowerFit_head",
-        "logarithm": "BoundLogFit_head", "gaussian": "BoundGaussianFit2026_head",
+        "logarithm": "BoundLogFit_head", "gaussian": "BoundGaussianFit2026_head", "gaussian_peak": "GaussianPeakFit2026_head",
         "linear": "GenLSFit80_head", "curve": "NonlinearFit2026",
         "nonlinear": "NonlinearFit2026",
         "Fit_covariance": "GenLSFit80_head", "Fit_confidence": "ConfBndGenLS_head",
