@@ -65,7 +65,10 @@ double Resonance(double x, const double *p, double *d) {
 const Problem problems[] = {
     {"decay", {3.0, 0.8, 1.0}, {2.0, 0.4, 0.5}, Decay},
     {"resonance", {4.0, 2.5, 0.6, 1.0}, {3.0, 2.0, 1.0, 0.5}, Resonance},
-    {"two peaks", {1.0, 0.2, 3.0, 1.5, 0.3, 2.0, 3.5, 0.5}, {0.5, 0.1, 2.0, 1.4, 0.4, 1.5, 3.7, 0.4}, Peaks},
+    {"two peaks",
+     {1.0, 0.2, 3.0, 1.5, 0.3, 2.0, 3.5, 0.5},
+     {0.5, 0.1, 2.0, 1.4, 0.4, 1.5, 3.7, 0.4},
+     Peaks},
 };
 
 struct Samples {
@@ -167,7 +170,8 @@ int main() {
             const Samples samples(problem, n);
             double peer = 0;
 #ifdef QX_PEER_GSL
-            const auto seconds = LeastTimes([&] { Keep(Ours(samples)); }, [&] { Keep(Theirs(samples)); });
+            const auto seconds =
+                LeastTimes([&] { Keep(Ours(samples)); }, [&] { Keep(Theirs(samples)); });
             peer = seconds[1];
             ratios.add(seconds[0] / peer, std::string(problem.name) + ", n " + std::to_string(n));
             const double excess = Ours(samples) / Theirs(samples) - 1;

@@ -189,8 +189,7 @@ QX_API ErrorCode BoundGaussianFit2026_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_I
                                            double tolerance, QX_INOUT int32_t *iterations,
                                            QX_IN DBL1D guess, QX_IN DBL1D lower, QX_IN DBL1D upper,
                                            uint16_t method, QX_OUT double *a, QX_OUT double *m,
-                                           QX_OUT double *s, QX_OUT double *c,
-                                           QX_OUT double *mse);
+                                           QX_OUT double *s, QX_OUT double *c, QX_OUT double *mse);
 
 QX_END_DECLS
 

@@ -26,7 +26,7 @@ typedef int32_t (*FitProcedure)(void *context, const DBL *x, int32_t xCount, con
         loss: 0 linear, rho(z) = z, which is least squares and has no scale; 1 soft, 2 (sqrt(1 + z) -
         1); 2 Huber's, z up to 1 and 2 sqrt(z) - 1 beyond; 3 Cauchy's, ln(1 + z); 4 arctan z.
 
-    x is handed on to the procedures and not looked at: one number for each sample, or as many as the
+    x is handed on to the procedures and not looked at, NaN included: one number for each sample, or as many as the
     model wants of each, or none. w holds a weight per sample, such as 1 / sd^2, or is empty. model
     gives the values, jacobian the derivatives or null: they are then central differences of the
     second order, near the end of the fourth, one-sided at bounds. context is for the procedures. guess
@@ -60,7 +60,7 @@ typedef int32_t (*FitProcedure)(void *context, const DBL *x, int32_t xCount, con
     cost or derivatives at the start), ErrNotAvailable (a procedure has ended the fit), ErrIterationLimit
     (the limit is reached; the outputs are valid), WarnRankDeficient (reason 3), WarnLowAccuracy (reason
     4).
-    NaN: x in some results; y, w, guess refused with ErrNonFiniteInput; lower, upper refused with
+    NaN: x refused with ErrNonFiniteFunction; y, w, guess refused with ErrNonFiniteInput; lower, upper refused with
     ErrNaNInData; scale refused with ErrNotStrictlyPositive or in no result; tolerance in no result. */
 QX_API ErrorCode NonlinearFit2026(QX_IN DBL1D x, QX_IN DBL1D y, QX_IN DBL1D w, FitProcedure model,
                                   FitProcedure jacobian, QX_IN void *context, QX_IN DBL1D guess,

@@ -208,8 +208,7 @@ private:
                 return failed;
         for (int32_t i = 0; i < n_; ++i)
             jacobian_(i, j) =
-                (4.0 * (probes_(0, i) - at.values[i]) - (probes_(1, i) - at.values[i])) /
-                (2.0 * h);
+                (4.0 * (probes_(0, i) - at.values[i]) - (probes_(1, i) - at.values[i])) / (2.0 * h);
         return 0;
     }
 
@@ -302,9 +301,10 @@ private:
         for (int32_t j = 0; j < k_; ++j) {
             const double s = move_.step[j];
             // A bound is met to the bit.
-            there_.p[j] = s == lowest_[j]    ? lower(j)
-                          : s == highest_[j] ? upper(j)
-                                             : std::min(std::max(here_.p[j] + s, lower(j)), upper(j));
+            there_.p[j] = s == lowest_[j] ? lower(j)
+                          : s == highest_[j]
+                              ? upper(j)
+                              : std::min(std::max(here_.p[j] + s, lower(j)), upper(j));
         }
         return model_.evaluate(there_);
     }
@@ -387,8 +387,8 @@ private:
             if (const ErrorCode failed = tryStep(kInfinity))
                 return failed;
             const double move = largestMove(), length = move_.length;
-            const bool isWorse = !(there_.cost <= here_.cost * (1.0 + 1e-6) + 0x1p-1000) ||
-                                 !(length < 0.7 * before);
+            const bool isWorse =
+                !(there_.cost <= here_.cost * (1.0 + 1e-6) + 0x1p-1000) || !(length < 0.7 * before);
             if (isWorse || length == 0.0 || !(move < 1e-2))
                 return 0;
             before = length;
@@ -433,7 +433,8 @@ private:
 
     bool hasFullRank(const ScaledColumns &columns) const {
         // Differences have no more digits than that.
-        const double least = (model_.hasDerivatives() ? 16.0 * kEpsilon : 1e-11) * columns.largest();
+        const double least =
+            (model_.hasDerivatives() ? 16.0 * kEpsilon : 1e-11) * columns.largest();
         for (int32_t i = 0; i < columns.count(); ++i)
             if (!(columns.sigma(i) > least))
                 return false;
@@ -448,7 +449,8 @@ private:
             for (int32_t b = 0; b <= a; ++b) {
                 double sum = 0.0;
                 for (int32_t i = 0; variance < kInfinity && i < n; ++i)
-                    sum += columns.v(a, i) / columns.sigma(i) * (columns.v(b, i) / columns.sigma(i));
+                    sum +=
+                        columns.v(a, i) / columns.sigma(i) * (columns.v(b, i) / columns.sigma(i));
                 const int32_t row = columns.column(a), col = columns.column(b);
                 const double element = variance < kInfinity
                                            ? sum * variance / lengths_[row] / lengths_[col]

@@ -18,11 +18,11 @@ struct SampledModel {
 
 // Why an iteration has ended.
 enum class FitEnd : int32_t {
-    Limit,         // of the iterations
-    Converged,     // no parameter would move by more than a part of itself
-    Exact,         // all residuals are 0
-    Undetermined,  // the residuals do not depend on each free parameter for itself
-    NoLowerCost    // no step lowers the cost, but there is no minimum to the digits that are claimed
+    Limit,        // of the iterations
+    Converged,    // no parameter would move by more than a part of itself
+    Exact,        // all residuals are 0
+    Undetermined, // the residuals do not depend on each free parameter for itself
+    NoLowerCost   // no step lowers the cost, but there is no minimum to the digits that are claimed
 };
 
 struct NonlinearFit {

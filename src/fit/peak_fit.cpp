@@ -104,7 +104,8 @@ private:
                 continue;
             FoundPeak found;
             const bool isFirst = best->cost == kInfinity;
-            ErrorCode failed = descend(start, isFirst ? limit_ : std::min(firstSteps, limit_), &found);
+            ErrorCode failed =
+                descend(start, isFirst ? limit_ : std::min(firstSteps, limit_), &found);
             if (failed == 0 && !isFirst && found.end == FitEnd::Limit && limit_ > firstSteps &&
                 found.cost < 1.05 * best->cost)
                 failed = descend({found.p[0], found.p[1], found.p[2], found.p[3], 0.0},
@@ -120,8 +121,14 @@ private:
 
     ErrorCode descend(const PeakStart &start, int32_t limit, FoundPeak *found) const {
         const ConstRealVector x = samples_.x;
-        NonlinearFit fit = {PeakOver(x),    samples_.y,         samples_.w, {{lower_, count}, {upper_, count}},
-                            Loss::Linear, 1.0, std::max(request_.tolerance, 0.0), limit};
+        NonlinearFit fit = {PeakOver(x),
+                            samples_.y,
+                            samples_.w,
+                            {{lower_, count}, {upper_, count}},
+                            Loss::Linear,
+                            1.0,
+                            std::max(request_.tolerance, 0.0),
+                            limit};
         found->p[0] = start.a;
         found->p[1] = start.m;
         found->p[2] = start.s;
@@ -179,8 +186,9 @@ ErrorCode Check(const BoundedFit &request, FitSamples *samples, int32_t free) {
 ErrorCode Repeat(const FitSamples &given, ScratchParts &memory, FitSamples *samples) {
     const int32_t n = given.n(), times = (count + n - 1) / n;
     RealVector x, y, w;
-    if (const ErrorCode failed = memory.take(Sized(x, int64_t{times} * n), Sized(y, int64_t{times} * n),
-                                             Sized(w, given.w.isEmpty() ? 0 : int64_t{times} * n)))
+    if (const ErrorCode failed =
+            memory.take(Sized(x, int64_t{times} * n), Sized(y, int64_t{times} * n),
+                        Sized(w, given.w.isEmpty() ? 0 : int64_t{times} * n)))
         return failed;
     for (int32_t i = 0; i < times * n; ++i) {
         x[i] = given.x[i % n];
@@ -290,7 +298,8 @@ ErrorCode FitRobustly(const BoundedFit &request, FitSamples samples, FoundPeak *
         if (const ErrorCode failed = Repeat(samples, copies, &samples))
             return failed;
     RealVector smooth, residuals;
-    if (const ErrorCode failed = memory.take(Sized(smooth, samples.n()), Sized(residuals, samples.n())))
+    if (const ErrorCode failed =
+            memory.take(Sized(smooth, samples.n()), Sized(residuals, samples.n())))
         return failed;
     if (const ErrorCode failed = SmoothByMedians(samples, smooth))
         return failed;

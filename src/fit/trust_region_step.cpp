@@ -89,12 +89,11 @@ ErrorCode TrustRegionStep::take(int32_t count) {
     if (const ErrorCode failed = columns_.take(count))
         return failed;
     return memory_.take(Sized(step, count), Sized(first_, count), Sized(rest_, count),
-                        Sized(projections_, count), Sized(isFree, count),
-                        Sized(isMoving_, count));
+                        Sized(projections_, count), Sized(isFree, count), Sized(isMoving_, count));
 }
 
-void TrustRegionStep::find(const LinearisedFit &fit, ConstRealVector scale,
-                           ConstRealVector lowest, ConstRealVector highest, double radius) {
+void TrustRegionStep::find(const LinearisedFit &fit, ConstRealVector scale, ConstRealVector lowest,
+                           ConstRealVector highest, double radius) {
     holdWhatIsAtABound(fit, lowest, highest);
     const int32_t k = fit.r.cols();
     for (int32_t j = 0; j < k; ++j) {

@@ -57,9 +57,9 @@ public:
               ConstRealVector highest, double radius);
 
     RealVector step;
-    double predicted = 0.0; // by how much half of |z + R s|^2 falls
-    double length = 0.0;    // |diag(scale) step|
-    bool isInside = false;  // neither the radius nor a bound is in the way
+    double predicted = 0.0;              // by how much half of |z + R s|^2 falls
+    double length = 0.0;                 // |diag(scale) step|
+    bool isInside = false;               // neither the radius nor a bound is in the way
     VectorView<ElementType::I32> isFree; // 0 where a parameter does not take part from the start
 
 private:

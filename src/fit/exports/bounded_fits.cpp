@@ -142,10 +142,10 @@ Outcome BoundedPeak(InOut<DBL1D> y, In<DBL1D> x, In<DBL1D> w, double tolerance, 
     const DBL *const start = GuessFrom<4>(guess, &warning);
     OutDBL p[] = {a, m, s, c};
     FitEnd end = FitEnd::Exact;
-    const ErrorCode status = FitBounded(
-        y, x, w, lower, upper, BadBounds::Fail,
-        RequestOf(start, method, tolerance, iterations, mse), p, 0,
-        [&](const BoundedFit &request) { return FitPeak(request, &end); });
+    const ErrorCode status =
+        FitBounded(y, x, w, lower, upper, BadBounds::Fail,
+                   RequestOf(start, method, tolerance, iterations, mse), p, 0,
+                   [&](const BoundedFit &request) { return FitPeak(request, &end); });
     if (status != 0)
         return status;
     const Outcome outcome = OutcomeOf(end);

@@ -58,14 +58,16 @@ ErrorCode CheckSamples(In<DBL1D> y, In<DBL1D> w, In<DBL1D> guess, int32_t free) 
     int32_t counting = w.isEmpty() ? y.size() : 0;
     for (const double weight : w.view())
         counting += weight != 0.0;
-    return FirstFailed({{CheckFinite(y.data(), y.size()) != 0 ||
-                             CheckFinite(w.data(), w.size()) != 0 ||
-                             CheckFinite(guess.data(), guess.size()) != 0,
-                         ErrNonFiniteInput},
-                        {counting < free, ErrTooFewWeights}});
+    return FirstFailed(
+        {{CheckFinite(y.data(), y.size()) != 0 || CheckFinite(w.data(), w.size()) != 0 ||
+              CheckFinite(guess.data(), guess.size()) != 0,
+          ErrNonFiniteInput},
+         {counting < free, ErrTooFewWeights}});
 }
 
-bool IsOfSize(In<DBL1D> bounds, int32_t count) { return bounds.isEmpty() || bounds.size() == count; }
+bool IsOfSize(In<DBL1D> bounds, int32_t count) {
+    return bounds.isEmpty() || bounds.size() == count;
+}
 
 Outcome FitCallersModel(In<DBL1D> x, In<DBL1D> y, In<DBL1D> w, FitProcedure model,
                         FitProcedure jacobian, void *context, In<DBL1D> guess, In<DBL1D> lower,

@@ -128,10 +128,9 @@ std::vector<Recipe> GaussianRecipes() {
          {3, 8, 50, 1000}},
         {"GaussianPeakFit2026_head",
          [](Call &c) {
-             return GaussianPeakFit2026_head(c.inOut<DBL>(0, c.n, Peak), Positions(c, 1),
-                                             Weights(c, 2), 0.0, NoGuess(c, 3), c.scalar(0),
-                                             c.scalar(1), c.scalar(2), c.scalar(3), Limit(c, 300),
-                                             0.0);
+             return GaussianPeakFit2026_head(
+                 c.inOut<DBL>(0, c.n, Peak), Positions(c, 1), Weights(c, 2), 0.0, NoGuess(c, 3),
+                 c.scalar(0), c.scalar(1), c.scalar(2), c.scalar(3), Limit(c, 300), 0.0);
          },
          None,
          {3, 8, 50, 1000}},

@@ -17,11 +17,12 @@ double Peak(int32_t i) {
 }
 
 // The resonance a / (1 + ((x - m) / s)^2) + c, for which arithmetic is enough.
-int32_t Resonance(void *, const ::DBL *x, int32_t, const ::DBL *p, int32_t, ::DBL *out, int32_t n) {
+int32_t Resonance(void *, const ::DBL *x, int32_t xCount, const ::DBL *p, int32_t, ::DBL *out,
+                  int32_t n) {
+    if (xCount < n || x[0] > 1e200)
+        return 1;
     for (int32_t i = 0; i < n; ++i) {
         const double z = (x[i] - p[1]) / p[2];
-        if (x[i] > 1e200)
-            return 1;
         out[i] = p[0] / (1.0 + z * z) + p[3];
     }
     return 0;

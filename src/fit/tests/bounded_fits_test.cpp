@@ -918,7 +918,8 @@ Fit ExactPeak(Noise &noise, Values *truth) {
     }
     const Values widths = {3 * std::fabs(a), range, (*truth)[2], 3 * std::fabs(a)};
     for (std::size_t j = 0; j < 4; ++j) {
-        f.lower.push_back(noise.symmetric() < -0.4 ? -inf : (*truth)[j] - widths[j] * uniform(0, 1));
+        f.lower.push_back(noise.symmetric() < -0.4 ? -inf
+                                                   : (*truth)[j] - widths[j] * uniform(0, 1));
         f.upper.push_back(noise.symmetric() < -0.4 ? inf
                                                    : (*truth)[j] + 3 * widths[j] * uniform(0, 1));
     }

@@ -178,8 +178,7 @@ inline const std::map<std::string, NistModel> &NistModels() {
          [](double x, double, const auto *b) {
              return b[0] * (x * x + x * b[1]) / (x * x + x * b[2] + b[3]);
          }},
-        {"MGH10",
-         [](double x, double, const auto *b) { return b[0] * exp(b[1] / (x + b[2])); }},
+        {"MGH10", [](double x, double, const auto *b) { return b[0] * exp(b[1] / (x + b[2])); }},
         {"MGH17",
          [](double x, double, const auto *b) {
              return b[0] + b[1] * exp(-x * b[3]) + b[2] * exp(-x * b[4]);
@@ -199,10 +198,8 @@ inline const std::map<std::string, NistModel> &NistModels() {
                       const auto *b) { return b[0] - b[1] * x * exp(-b[2] * second); }},
         {"Rat42",
          [](double x, double, const auto *b) { return b[0] / (1 + exp(b[1] - b[2] * x)); }},
-        {"Rat43",
-         [](double x, double, const auto *b) {
-             return b[0] / pow(1 + exp(b[1] - b[2] * x), 1 / b[3]);
-         }},
+        {"Rat43", [](double x, double,
+                     const auto *b) { return b[0] / pow(1 + exp(b[1] - b[2] * x), 1 / b[3]); }},
         {"Roszman1",
          [](double x, double, const auto *b) {
              return b[0] - b[1] * x - atan(b[2] / (x - b[3])) / std::numbers::pi;

@@ -224,12 +224,13 @@ TEST(NonlinearFit, KnowsTheErrors) {
         const std::size_t count = set.certified.size();
         std::vector<DBL> covariance(count * count);
         Values p;
-        problem.fit(1, true, &p, 0.0, {covariance.data(), static_cast<int32_t>(count),
-                                       static_cast<int32_t>(count)});
+        problem.fit(1, true, &p, 0.0,
+                    {covariance.data(), static_cast<int32_t>(count), static_cast<int32_t>(count)});
         // The squares of Lanczos1 are rounding errors.
         const double digits = set.name == "Lanczos1" ? 1e-2 : 1e-8;
         for (std::size_t j = 0; j < count; ++j)
-            EXPECT_NEAR(std::sqrt(covariance[j * (count + 1)]), set.errors[j], digits * set.errors[j])
+            EXPECT_NEAR(std::sqrt(covariance[j * (count + 1)]), set.errors[j],
+                        digits * set.errors[j])
                 << set.name;
     }
 }
@@ -241,7 +242,9 @@ TEST(NonlinearFit, KeepsItsDigitsAtAnySize) {
         Fit fit = Decay();
         for (double &y : fit.y)
             y *= size;
-        fit.model = [size](double x, const Values &p) { return p[0] * exp(-p[1] / size * x) + p[2]; };
+        fit.model = [size](double x, const Values &p) {
+            return p[0] * exp(-p[1] / size * x) + p[2];
+        };
         fit.guess = {size, size, 0.1 * size};
         fit.run();
         EXPECT_EQ(fit.reason, 1);
@@ -316,7 +319,10 @@ TEST(NonlinearFit, RefusesWhatCannotBe) {
     EXPECT_EQ(code([](Fit &fit) { fit.loss = 5; }), ErrInvalidSelector);
     EXPECT_EQ(code([](Fit &fit) { fit.loss = 1, fit.scale = 0; }), ErrNotStrictlyPositive);
     EXPECT_EQ(code([](Fit &fit) { fit.lower = {nan, 0, 0}; }), ErrNaNInData);
-    EXPECT_EQ(code([](Fit &fit) { fit.lower = {1, 1, 1}, fit.upper = {2, 0, 2}; }), ErrBoundsCrossed);
+    EXPECT_EQ(code([](Fit &fit) {
+                  fit.lower = {1, 1, 1}, fit.upper = {2, 0, 2};
+              }),
+              ErrBoundsCrossed);
     EXPECT_EQ(code([](Fit &fit) { fit.x = {1, 2}, fit.y = {1, 2}; }), ErrFitPointsTooFew);
     EXPECT_EQ(code([](Fit &fit) { fit.y[3] = nan; }), ErrNonFiniteInput);
     EXPECT_EQ(code([](Fit &fit) { fit.w.assign(30, 0), fit.w[4] = 1; }), ErrTooFewWeights);
