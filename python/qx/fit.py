@@ -21,11 +21,11 @@ from typing import Any, Literal
 import numpy as np
 from numpy.typing import ArrayLike, NDArray
 
-from .outcomes import QxWarning, warn
+from .outcomes import QxError
 from .topical import Result, chosen, refuse, result, served, vector, whole_number
 
 __all__ = ["BSpline", "Fit", "SmoothingSpline", "curve", "exponential", "gaussian", "line", "linear",
-           "logarithm", "polynomial", "power"]
+           "logarithm", "nonlinear", "polynomial", "power"]
 
 core = served("fit")
 
@@ -33,6 +33,9 @@ EMPTY = np.empty(0)
 NATURAL = 2.71828  # the exports take these digits for e
 TOLERANCE, ITERATIONS = 1e-12, 2000
 METHODS = {"least squares": 0, "absolute": 1, "bisquare": 2}
+LOSSES = {"linear": 0, "soft_l1": 1, "huber": 2, "cauchy": 3, "arctan": 4}
+UNDETERMINED = 3  # the reason for the end of a fit
+SETTLED = 1e-10  # the part of itself by which a parameter may still move
 
 
 @result
@@ -299,9 +302,16 @@ def _rows(names: Any) -> Any:
 
 
 @_maker
-def _any(f: Any, names: Any) -> Any:
+def _any(f: Any, names: Any, jacobian: Any) -> Any:
+    slopes = None if jacobian is None else lambda x, p: np.asarray(jacobian(x, *p), float)
     return _Model(f"{getattr(f, '__name__', 'f')}(x, {', '.join(names)})", names,
-                  lambda x, p: np.asarray(f(x, *p), float) + np.zeros(np.shape(x)))
+                  lambda x, p: np.asarray(f(x, *p), float) + np.zeros(np.shape(x)), slopes)
+
+
+@_maker
+def _of_vector(f: Any, names: Any, jacobian: Any) -> Any:
+    slopes = None if jacobian is None else lambda x, p: np.asarray(jacobian(x, p), float)
+    return _Model(f"{getattr(f, '__name__', 'f')}(x, p)", names, lambda x, p: np.asarray(f(x, p), float), slopes)
 
 
 def _samples(function: Any, x: Any, y: Any, sigma: Any) -> tuple[NDArray[Any], NDArray[Any], NDArray[Any]]:
@@ -318,8 +328,9 @@ def _samples(function: Any, x: Any, y: Any, sigma: Any) -> tuple[NDArray[Any], N
     return x, y, 1 / sigma**2
 
 
-def _finished(model: Any, x: Any, y: Any, w: Any, p: Any, fixed: Any = None, absolute: Any = False) -> Any:
-    """The Fit of parameters that were found."""
+def _finished(model: Any, x: Any, y: Any, w: Any, p: Any, fixed: Any = None, absolute: Any = False,
+              covariance: Any = None) -> Any:
+    """The Fit of parameters that were found, and their covariance where it is known."""
     p = np.array([float(one) for one in p])
     fixed = np.zeros(len(p), bool) if fixed is None else np.asarray(fixed, bool)
     values = model.value(x, p)
@@ -330,9 +341,11 @@ def _finished(model: Any, x: Any, y: Any, w: Any, p: Any, fixed: Any = None, abs
     about = y - (np.average(y, weights=w) if len(w) else np.mean(y))
     total = float(np.sum(about**2 if not len(w) else w * about**2))
     variance = sse / dof if dof > 0 else math.inf
-    covariance = np.zeros((len(p), len(p)))
     free = np.flatnonzero(~fixed)
-    if len(free) and len(x) >= len(free):
+    is_known = covariance is not None
+    if not is_known:
+        covariance = np.zeros((len(p), len(p)))
+    if not is_known and len(free) and len(x) >= len(free):
         rows = np.ascontiguousarray(model.jacobian(x, p)[:, free])
         if np.all(np.isfinite(rows)):
             inverse = core.Fit_covariance(rows, residuals, w, 0, 1)[2]
@@ -657,6 +670,10 @@ def gaussian(x: ArrayLike, y: ArrayLike, sigma: ArrayLike | None = None, offset:
     {'a': 2.0, 'm': 1.0, 's': 0.5, 'c': 1.0}
     """
     x, y, w = _samples("gaussian", x, y, sigma)
+    if not offset and not bounds and method == "least squares":
+        start = _limits("gaussian", "ams", None, guess, {})[2]
+        p = core.gaussian_peak(y, x, w, TOLERANCE, start, ITERATIONS, 0.0)[1:4]
+        return _finished(_gaussian(False), x, y, w, p)
     return _bounded("gaussian", lambda y, x, w, start, lower, upper, code: core.gaussian(
         y, x, w, TOLERANCE, ITERATIONS, start, lower, upper, code)[2:6], _gaussian(bool(offset)), x, y, w,
         bounds, guess, method, {} if offset else {"c": 0.0})
@@ -709,14 +726,17 @@ def linear(H: ArrayLike, y: ArrayLike, sigma: ArrayLike | None = None,
 
 def curve(f: Callable[..., Any], x: ArrayLike, y: ArrayLike, guess: dict[str, Any] | Sequence[Any],
           sigma: ArrayLike | None = None, bounds: dict[str, Any] | None = None,
-          absolute_sigma: bool = False) -> Fit:
-    """Any model, by Levenberg-Marquardt steps with derivatives from differences (D. W. Marquardt, "An
-    algorithm for least-squares estimation of nonlinear parameters", 1963).
+          absolute_sigma: bool = False, jacobian: Callable[..., Any] | None = None,
+          loss: Literal["linear", "soft_l1", "huber", "cauchy", "arctan"] = "linear",
+          scale: float = 1.0) -> Fit:
+    """Any model, by a trust region (J. J. More, "The Levenberg-Marquardt algorithm: implementation and
+    theory", 1978).
 
     Parameters
     ----------
     f : callable
-        f(x, a, b, ...): the model; the names of its arguments are those of the parameters.
+        f(x, a, b, ...): the model; the names of its arguments are those of the parameters. An exception in
+        it ends the fit.
     x, y : array_like
         The samples.
     guess : dict or sequence
@@ -724,20 +744,35 @@ def curve(f: Callable[..., Any], x: ArrayLike, y: ArrayLike, guess: dict[str, An
     sigma : float or array_like, optional
         The standard deviation of each y, up to a factor.
     bounds : dict, optional
-        By the name of a parameter its lower and upper bound; equal ones fix it.
+        By the name of a parameter its lower and upper bound; equal ones fix it. f is not asked for values
+        beyond them.
     absolute_sigma : bool
         Whether sigma are the standard deviations themselves: the covariance then does not take the
         scatter of the residuals.
+    jacobian : callable, optional
+        jacobian(x, a, b, ...): the derivatives of f by its parameters, a row for each sample. By
+        differences where there is none.
+    loss : {"linear", "soft_l1", "huber", "cauchy", "arctan"}
+        How squared residuals count, as of `scipy.optimize.least_squares`: all but "linear" count
+        less what lies far off. The covariance is to first order, as the loss counts the derivatives.
+    scale : float
+        From which residual on, in units of sigma, that is.
 
     Returns
     -------
     Fit
 
+    Warns
+    -----
+    QxWarning
+        If the samples do not determine each parameter, whose errors are infinite then, or the parameters
+        are not at rest to 7 digits.
+
     Raises
     ------
     ValueError
-        If x and y differ in length, there are fewer samples than parameters, a sigma is not above 0,
-        bounds cross, or a word is none of its words.
+        If x and y differ in length, there are fewer samples than parameters, a sigma or the scale is not
+        above 0, bounds cross, or a word is none of its words.
     QxError
         If the fit does not come to an end.
 
@@ -755,54 +790,101 @@ def curve(f: Callable[..., Any], x: ArrayLike, y: ArrayLike, guess: dict[str, An
     if len(given) != len(names) or set(start) != set(names):
         refuse("fit.curve", "guess", f"values for {', '.join(names)} are needed; {guess!r} came", "ErrFitStartValues")
     x, y, w = _samples("curve", x, y, sigma)
+    return _nonlinear("curve", _any(f, tuple(names), jacobian), x, y, w, start, bounds, absolute_sigma,
+                      jacobian is not None, loss, scale)
+
+
+def nonlinear(f: Callable[..., Any], x: ArrayLike, y: ArrayLike, guess: Sequence[Any],
+              sigma: ArrayLike | None = None, bounds: dict[str, Any] | None = None,
+              absolute_sigma: bool = False, jacobian: Callable[..., Any] | None = None,
+              loss: Literal["linear", "soft_l1", "huber", "cauchy", "arctan"] = "linear",
+              scale: float = 1.0, names: Sequence[str] | None = None) -> Fit:
+    """As `curve`, for models f(x, p) whose parameters are an array, of samples with one or several x each.
+
+    Parameters
+    ----------
+    f : callable
+        f(x, p): the model. An exception in it ends the fit.
+    x : array_like
+        A number, a row or an array for each sample.
+    y : array_like
+        The samples.
+    guess : sequence
+        Start values of p.
+    sigma, absolute_sigma, loss, scale
+        As of `curve`.
+    bounds : dict, optional
+        By the name of a parameter its lower and upper bound; equal ones fix it.
+    jacobian : callable, optional
+        jacobian(x, p): the derivatives of f by p, a row for each sample.
+    names : sequence of str, optional
+        Names of the parameters; p0, p1, ... by default.
+
+    Returns
+    -------
+    Fit
+
+    Raises
+    ------
+    ValueError
+        If x and y differ in length, there are fewer samples than parameters, a sigma or the scale is not
+        above 0, bounds cross, or a word is none of its words.
+    QxError
+        If the fit does not come to an end.
+
+    Examples
+    --------
+    >>> import numpy as np, qx
+    >>> x = np.random.default_rng(1).uniform(size=(40, 2))
+    >>> y = 2 * np.exp(-x[:, 0]) * np.cos(3 * x[:, 1])
+    >>> fit = qx.fit.nonlinear(lambda x, p: p[0] * np.exp(-x[:, 0]) * np.cos(p[1] * x[:, 1]), x, y, [1, 2])
+    >>> {name: round(value, 6) for name, value in fit.parameters.items()}
+    {'p0': 2.0, 'p1': 3.0}
+    """
+    start = [float(one) for one in guess]
+    names = [f"p{j}" for j in range(len(start))] if names is None else list(names)
+    if len(names) != len(start) or len(set(names)) < len(names):
+        refuse("fit.nonlinear", "names", f"{len(start)} different ones are needed; {names!r} came", "ErrSizesDisagree")
+    x = np.asarray(x, float)
+    if not x.ndim:
+        refuse("fit.nonlinear", "x", "a number or a row for each sample is needed; one number came", "ErrEmptyInput")
+    _, y, w = _samples("nonlinear", np.zeros(len(x)), y, sigma)
+    return _nonlinear("nonlinear", _of_vector(f, tuple(names), jacobian), x, y, w, dict(zip(names, start)), bounds,
+                      absolute_sigma, jacobian is not None, loss, scale)
+
+
+def _nonlinear(function: Any, model: Any, x: Any, y: Any, w: Any, start: Any, bounds: Any, absolute: Any,
+               has_jacobian: Any, loss: Any, scale: Any) -> Any:
+    """The fit of a model whose values and derivatives are those of Python functions."""
+    code = chosen(f"fit.{function}", "loss", loss, LOSSES)
+    names = model.names
     if len(x) < len(names):
-        refuse("fit.curve", "x", f"at least {len(names)} samples are needed; {len(x)} came", "ErrFitPointsTooFew")
-    model = _any(f, tuple(names))
-    lower, upper, p = _limits("curve", names, bounds, start, {})
-    lower, upper = np.array(lower), np.array(upper)
-    p = _marquardt(model, x, y, w, np.clip(p, lower, upper), lower, upper)
-    return _finished(model, x, y, w, p, lower == upper, absolute_sigma)
-
-
-def _marquardt(model: Any, x: Any, y: Any, w: Any, p: Any, lower: Any, upper: Any) -> Any:
-    """The parameters with the least weighted squares between the bounds."""
-    def cost_of(p: Any) -> Any:
-        residuals = y - model.value(x, p)
-        return residuals, float(np.sum(residuals**2 if not len(w) else w * residuals**2))
-
-    residuals, cost = cost_of(p)
-    if not np.isfinite(cost):
-        refuse("fit.curve", "guess", "the model is not finite there", "ErrNaNInData")
-    damping = 1e-3
-    for _ in range(ITERATIONS):
-        rows = model.jacobian(x, p)
-        gradient = rows.T @ (residuals if not len(w) else w * residuals)
-        free = (lower < upper) & ~((p <= lower) & (gradient < 0)) & ~((p >= upper) & (gradient > 0))
-        if not free.any() or cost == 0:
-            return p
-        rows = rows[:, free]
-        matrix = np.ascontiguousarray(rows.T @ (rows if not len(w) else w[:, None] * rows))
-        while True:
-            trial = p.copy()
-            try:
-                trial[free] = core.curve(p[free], matrix, np.ascontiguousarray(gradient[free]), damping)
-            except np.linalg.LinAlgError:
-                refuse("fit.curve", "f", "does not depend on each parameter at " + ", ".join(
-                    f"{name} {one:.6g}" for name, one in zip(model.names, p)), "ErrSingularMatrix")
-            trial = np.clip(trial, lower, upper)
-            with np.errstate(all="ignore"):
-                new_residuals, new_cost = cost_of(trial)
-            if new_cost < cost:
-                break
-            damping *= 10
-            if damping > 1e12:
-                return p
-        is_done = cost - new_cost <= 1e-14 * cost and np.all(np.abs(trial - p) <= 1e-9 * (np.abs(p) + 1e-300))
-        p, residuals, cost, damping = trial, new_residuals, new_cost, max(damping / 10, 1e-15)
-        if is_done:
-            return p
-    warn(QxWarning("qx.fit.curve", 20010, f"qx.fit.curve: not at rest after {ITERATIONS} steps"))
-    return p
+        refuse(f"fit.{function}", "x", f"at least {len(names)} samples are needed; {len(x)} came",
+               "ErrFitPointsTooFew")
+    if not scale > 0:
+        refuse(f"fit.{function}", "scale", f"must be above 0; {scale} came", "ErrNotStrictlyPositive")
+    lower, upper, p = _limits(function, names, bounds, start, {})
+    export = getattr(core, function)
+    jacobian = (lambda _, p: model.jacobian(x, p)) if has_jacobian else None
+    with np.errstate(all="ignore"):
+        try:
+            _, p, covariance, _, cost, reason = export(
+                EMPTY, y, w, lambda _, p: model.value(x, p), jacobian, None, p, lower, upper, code, float(scale),
+                SETTLED, ITERATIONS)
+        except QxError as error:
+            if error.name == "ErrNonFiniteFunction":
+                refuse(f"fit.{function}", "guess", "the model is not finite there", "ErrNaNInData")
+            raise
+    fixed = np.equal(lower, upper)
+    if reason == UNDETERMINED:
+        without = ~np.any(model.jacobian(x, p), 0) & ~fixed
+        if without.any():
+            refuse(f"fit.{function}", "f", "does not depend on each parameter at " + ", ".join(
+                f"{name} {one:.6g}" for name, one in zip(names, p)), "ErrSingularMatrix")
+    if absolute:
+        dof = len(y) - np.count_nonzero(~fixed)
+        covariance = covariance / (2 * cost / dof) if cost > 0 and dof > 0 else None
+    return _finished(model, x, y, w, p, fixed, absolute, covariance)
 
 
 class SmoothingSpline:

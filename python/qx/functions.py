@@ -18,6 +18,7 @@ from . import arrays, plans
 from .library import library
 from .outcomes import tell
 from .pointers import GIVES_BACK, address, pointer
+from .procedures import FIT, Procedure
 from .records import Record
 from .scalars import C_TYPES, COMPLEX, LIMITS, c_number, chosen, real, shown, whole
 
@@ -67,7 +68,7 @@ def annotation(argument):
     if kind == "opaque":
         return "Pointer | None"
     if kind == "procedure":
-        return "Any"
+        return "Callable[..., Any] | None"
     return "complex" if element in COMPLEX else "int" if element in LIMITS else "float"
 
 
@@ -151,7 +152,7 @@ class Writer:
                       "_real": real, "_chosen": chosen, "_c_number": c_number, "_word": plans.word,
                       "_Record": Record,
                       "_address": address, "_pointer": pointer, "_buffer": buffer, "_many": many,
-                      "_mapped": mapped, "_procedure": procedure,
+                      "_mapped": mapped, "_Procedure": Procedure,
                       # An argument may be called as a type is.
                       "_type": type, "_int": int, "_float": float, "_complex": complex}
         for i, argument in enumerate(entry["arguments"]):
@@ -269,8 +270,10 @@ class Writer:
         self._pass(f"_{i}")
 
     def _procedure(self, i, argument):
-        self.before.append(f"_procedure({self._place(argument)})")
-        self._pass("None")
+        self.before.append(f"_{i} = _Procedure({python_name(argument)}, {argument['name'] == 'jacobian'}, "
+                           f"{self._place(argument)})")
+        self.after.append(f"_{i}.raise_again()")
+        self._pass(f"_{i}.address", FIT)
 
     def _mapping(self):
         """The way of a function of numbers that is given arrays."""
@@ -320,10 +323,6 @@ class Writer:
         text = "\n\n".join(filter(None, [documentation(self.entry), surroundings(self.entry)]))
         function.__module__, function.__doc__ = "qx", text
         return function
-
-
-def procedure(place):
-    raise TypeError(f"{place}: a procedure in C is needed, which cannot be given from Python")
 
 
 def buffer(value, element, count, place):

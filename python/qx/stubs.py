@@ -44,7 +44,7 @@ def names() -> _list[str]: ...
 
 EXPORTS = '''"""Every export as a function. Written by qx.stubs from the catalogue."""
 
-from collections.abc import Mapping
+from collections.abc import Callable, Mapping
 from typing import Any
 
 import numpy as np

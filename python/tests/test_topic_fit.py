@@ -1,5 +1,6 @@
 """qx.fit, qx.stats and qx.measure beside SciPy, and their streams."""
 
+import concurrent.futures
 import pickle
 import sys
 import unittest
@@ -17,7 +18,7 @@ from hypothesis import strategies
 PYTHON = Path(__file__).resolve().parent.parent
 sys.path.insert(0, str(PYTHON))
 import qx  # noqa: E402
-from qx import fit, measure, signals, stats  # noqa: E402
+from qx import exports, fit, measure, signals, stats  # noqa: E402
 
 RNG = np.random.default_rng(7)
 
@@ -33,6 +34,15 @@ MODELS = {
     "logarithm": (lambda x, a, b: a * np.log(b * x), (2.0, 1.5), {}),
     "gaussian": (lambda x, a, m, s, c: a * np.exp(-0.5 * ((x - m) / s)**2) + c, (3.0, 1.4, 0.3, 0.5), {}),
 }
+
+
+def model_of_rows(x, p):
+    return p[0] * np.exp(-x[:, 0]) * np.cos(p[1] * x[:, 1])
+
+
+def interrupted(x, p):
+    raise KeyboardInterrupt
+
 
 # The same cases in each run, and no folder of earlier ones.
 hypothesis.settings.register_profile("same", derandomize=True, database=None)
@@ -123,6 +133,70 @@ class Fits(unittest.TestCase):
         close(fit.polynomial(x, 2 * x + x**2, 2, fixed={"c0": 0.0})["c1"], 2)
         close(fit.curve(lambda x, a: a * x, x, 2 * x, [1], sigma=0.5, absolute_sigma=True).errors["a"],
               0.5 / np.sqrt(np.sum(x**2)), 1e-6)
+
+    def test_losses_and_derivatives(self):
+        rng, x = np.random.default_rng(3), np.linspace(0, 4, 50)
+        model = MODELS["exponential"][0]
+        y = model(x, 3, -1.2, 0.5) + rng.normal(size=50) * 0.02
+        y[::9] += 1.5
+
+        def jacobian(x, a, b, c):
+            return np.stack([np.exp(b * x), a * x * np.exp(b * x), np.ones(len(x))], -1)
+
+        for loss in ("linear", "soft_l1", "huber", "cauchy", "arctan"):
+            theirs = scipy.optimize.least_squares(lambda p: (y - model(x, *p)) / 0.1, (3, -1, 0.5), loss=loss,
+                                                  f_scale=0.5, xtol=1e-15, ftol=1e-15, gtol=1e-15)
+            for more in ({}, {"jacobian": jacobian}):
+                found = fit.curve(model, x, y, (3, -1, 0.5), 0.1, loss=loss, scale=0.5, **more)
+                close([*found.parameters.values()], theirs.x, 1e-5)
+                inverse = np.linalg.inv(theirs.jac.T @ theirs.jac)
+                close(found.covariance, inverse * 2 * theirs.cost / 47, 2e-3, 1e-6)
+                close(found.predict(1.5), model(1.5, *found.parameters.values()))
+
+    def test_models_of_arrays(self):
+        rng = np.random.default_rng(4)
+        x = rng.uniform(size=(60, 2))
+        y = model_of_rows(x, [2.0, 3.0]) + 0.01 * rng.normal(size=60)
+        found = fit.nonlinear(model_of_rows, x, y, [1, 2], bounds={"p1": (0, 2.9)}, names=["height", "p1"])
+        self.assertEqual([*found.parameters], ["height", "p1"])
+        self.assertEqual(found["p1"], 2.9)
+        again = pickle.loads(pickle.dumps(found))
+        close(again.predict(x[:3]), found.values[:3])
+        self.assertEqual(found.confidence(x[:4])[0].shape, (4,))
+        # From several threads at once, and within a model.
+        with concurrent.futures.ThreadPoolExecutor(4) as threads:
+            every = [*threads.map(lambda _: fit.nonlinear(model_of_rows, x, y, [1, 2])["p1"], range(8))]
+        self.assertEqual(len(set(every)), 1)
+        line = np.arange(9.0)
+        self.assertEqual(fit.curve(lambda x, a: a * x * fit.line(line, line)["a"], line, line, [3])["a"], 1)
+
+    def test_exceptions_of_a_model_come_through(self):
+        x = np.arange(5.0)
+        calls = []
+
+        def model(x, a):
+            calls.append(a)
+            if len(calls) == 3:
+                raise KeyError("stop here")
+            return a * x + 1 / (a + 2)
+
+        with self.assertRaisesRegex(KeyError, "stop here"):
+            fit.curve(model, x, x, [1])
+        self.assertEqual(len(calls), 3)
+        with self.assertRaises(KeyboardInterrupt):
+            fit.nonlinear(interrupted, x, x, [1])
+        with self.assertRaisesRegex(ValueError, "model: values of shape .5,. are needed; .2,. came"):
+            exports.NonlinearFit2026(x, x, [], lambda x, p: [1, 2], None, None, [1], [], [], 0, 1, 0, 0)
+        with self.assertRaisesRegex(TypeError, "jacobian: a function is needed"):
+            exports.NonlinearFit2026(x, x, [], model, 3, None, [1], [], [], 0, 1, 0, 0)
+        with self.assertRaisesRegex(qx.QxError, "model is null"):
+            exports.NonlinearFit2026(x, x, [], None, None, None, [1], [], [], 0, 1, 0, 0)
+
+    def test_peaks_need_no_guess(self):
+        x = np.linspace(-5, 60, 150)
+        for offset, truth in ((True, (-3, 55.0, 0.4, 1)), (False, (0.2, -6.0, 30.0)), (True, (5, 30, 40, -7))):
+            found = fit.gaussian(x, MODELS["gaussian"][0](x, *truth, *([] if offset else [0])), offset=offset)
+            close([*found.parameters.values()], truth, 1e-7)
 
     def test_what_cannot_be_is_refused(self):
         x = np.arange(5.0)

@@ -2,6 +2,7 @@
 
 #include "fit/bounded_fits.h"
 #include "fit/exports/fit_arguments.h"
+#include "fit/peak_fit.h"
 #include "frame/constants.h"
 
 #include <cmath>
@@ -134,6 +135,23 @@ Outcome BoundedGaussian(InOut<DBL1D> y, In<DBL1D> x, In<DBL1D> w, double toleran
                       FitBoundedGaussian);
 }
 
+Outcome BoundedPeak(InOut<DBL1D> y, In<DBL1D> x, In<DBL1D> w, double tolerance, OutI32 iterations,
+                    In<DBL1D> guess, In<DBL1D> lower, In<DBL1D> upper, uint16_t method, OutDBL a,
+                    OutDBL m, OutDBL s, OutDBL c, OutDBL mse) {
+    ErrorCode warning = 0;
+    const DBL *const start = GuessFrom<4>(guess, &warning);
+    OutDBL p[] = {a, m, s, c};
+    FitEnd end = FitEnd::Exact;
+    const ErrorCode status =
+        FitBounded(y, x, w, lower, upper, BadBounds::Fail,
+                   RequestOf(start, method, tolerance, iterations, mse), p, 0,
+                   [&](const BoundedFit &request) { return FitPeak(request, &end); });
+    if (status != 0)
+        return status;
+    const Outcome outcome = OutcomeOf(end);
+    return outcome ? outcome : warning;
+}
+
 } // namespace
 } // namespace qx
 
@@ -183,4 +201,12 @@ ErrorCode BoundGaussianFit_head(DBL1D y, DBL1D x, DBL1D w, double tolerance, int
                                 double *m, double *s, double *c, double *mse) {
     return Returned(qx::BoundedGaussian, y, x, w, tolerance, iterations, guess, lower, upper,
                     method, a, m, s, c, mse);
+}
+
+ErrorCode BoundGaussianFit2026_head(DBL1D y, DBL1D x, DBL1D w, double tolerance,
+                                    int32_t *iterations, DBL1D guess, DBL1D lower, DBL1D upper,
+                                    uint16_t method, double *a, double *m, double *s, double *c,
+                                    double *mse) {
+    return Returned(qx::BoundedPeak, y, x, w, tolerance, iterations, guess, lower, upper, method, a,
+                    m, s, c, mse);
 }

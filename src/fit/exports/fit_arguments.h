@@ -1,6 +1,7 @@
 #ifndef QX_FIT_EXPORTS_FIT_ARGUMENTS_H
 #define QX_FIT_EXPORTS_FIT_ARGUMENTS_H
 
+#include "fit/nonlinear.h"
 #include "fit/weights.h"
 #include "frame/export.h"
 
@@ -76,6 +77,20 @@ private:
     const DBL *data_;
     bool isOdd_;
 };
+
+// The code of an end; the limit leaves the results where they are.
+inline Outcome OutcomeOf(FitEnd end) {
+    switch (end) {
+    case FitEnd::Limit:
+        return Outcome::WithResults(ErrIterationLimit);
+    case FitEnd::Undetermined:
+        return WarnRankDeficient;
+    case FitEnd::NoLowerCost:
+        return WarnLowAccuracy;
+    default:
+        return 0;
+    }
+}
 
 } // namespace qx
 

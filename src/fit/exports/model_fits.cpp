@@ -4,6 +4,8 @@
 #include "fit/exports/fit_arguments.h"
 #include "fit/gaussian.h"
 #include "fit/logarithm.h"
+#include "fit/peak_fit.h"
+#include "frame/constants.h"
 
 namespace qx {
 namespace {
@@ -73,6 +75,36 @@ Outcome Gaussian(typename Gives::Y y, In<DBL1D> x, In<DBL1D> w, double tolerance
     return Iterated<Gives>(y, x, w, tolerance, guess, p, mse, iterations, floor, FitGaussian);
 }
 
+// The peak within bounds, whose level is fixed at 0.
+Outcome PeakAtEveryScale(InOut<DBL1D> y, In<DBL1D> x, In<DBL1D> w, double tolerance,
+                         In<DBL1D> guess, OutDBL a, OutDBL c, OutDBL s, OutDBL mse,
+                         OutI32 iterations, double) {
+    if (!SizesFit(y, x, w))
+        return ErrSizeMismatch;
+    const Guess start(guess, 3);
+    const DBL lower[] = {-kInfinity, -kInfinity, -kInfinity, 0.0};
+    const DBL upper[] = {kInfinity, kInfinity, kInfinity, 0.0};
+    DBL p[4] = {}, first[4] = {};
+    for (int32_t j = 0; start.data() != nullptr && j < 3; ++j)
+        first[j] = start.data()[j];
+    FitEnd end = FitEnd::Exact;
+    const BoundedFit request = {.samples = SamplesOf(y, x, w),
+                                .guess = start.data() != nullptr ? first : nullptr,
+                                .bounds = {{lower, 4}, {upper, 4}},
+                                .tolerance = tolerance,
+                                .iterations = iterations.address(),
+                                .p = p,
+                                .mse = mse.address(),
+                                .values = y.view()};
+    if (const ErrorCode failed = FitPeak(request, &end))
+        return failed;
+    a = p[0];
+    c = p[1];
+    s = p[2];
+    const Outcome outcome = OutcomeOf(end);
+    return outcome ? outcome : start.merge(0);
+}
+
 template <class Gives>
 Outcome Logarithm(typename Gives::Y y, In<DBL1D> x, In<DBL1D> w, double base, OutDBL a, OutDBL b,
                   typename Gives::MSE mse) {
@@ -140,4 +172,10 @@ ErrorCode GaussianPeakFitCoef_head(DBL1D y, DBL1D x, DBL1D w, double tolerance, 
                                    double floor) {
     return Returned(qx::Gaussian<CoefficientsOnly>, y, x, w, tolerance, guess, a, c, s, nullptr,
                     iterations, floor);
+}
+ErrorCode GaussianPeakFit2026_head(DBL1D y, DBL1D x, DBL1D w, double tolerance, DBL1D guess,
+                                   double *a, double *c, double *s, double *mse,
+                                   int32_t *iterations, double floor) {
+    return Returned(qx::PeakAtEveryScale, y, x, w, tolerance, guess, a, c, s, mse, iterations,
+                    floor);
 }

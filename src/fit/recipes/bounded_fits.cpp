@@ -122,6 +122,21 @@ std::vector<Recipe> ModelRecipes() {
                            },
                            None, sizes});
     }
+    for (uint16_t method = 0; method < 3; ++method)
+        for (const bool isGuessed : {false, true})
+            recipes.push_back({std::string("BoundGaussianFit2026_head: ") + methods[method] +
+                                   (isGuessed ? ", guess" : ""),
+                               [method, isGuessed](Call &c) {
+                                   const auto guess = isGuessed
+                                                          ? Values(c, 3, {3.0, 2.25, 1.0, 0.5})
+                                                          : Values(c, 3, {});
+                                   return BoundGaussianFit2026_head(
+                                       c.inOut<DBL>(0, c.n, Peak), Positions(c, 1), Weights(c, 2),
+                                       1e-6, Limit(c), guess, Values(c, 4, {0.0, 0.0, 0.125, 0.25}),
+                                       Values(c, 5, {inf, 5.0, 5.0, inf}), method, c.scalar(0),
+                                       c.scalar(1), c.scalar(2), c.scalar(3), c.scalar(4));
+                               },
+                               None, sizes});
     recipes.push_back({"BoundGaussianFit_head: own start",
                        [](Call &c) {
                            return BoundGaussianFit_head(

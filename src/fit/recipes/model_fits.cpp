@@ -126,6 +126,23 @@ std::vector<Recipe> GaussianRecipes() {
          },
          None,
          {3, 8, 50, 1000}},
+        {"GaussianPeakFit2026_head",
+         [](Call &c) {
+             return GaussianPeakFit2026_head(
+                 c.inOut<DBL>(0, c.n, Peak), Positions(c, 1), Weights(c, 2), 0.0, NoGuess(c, 3),
+                 c.scalar(0), c.scalar(1), c.scalar(2), c.scalar(3), Limit(c, 300), 0.0);
+         },
+         None,
+         {3, 8, 50, 1000}},
+        {"GaussianPeakFit2026_head: guess",
+         [](Call &c) {
+             return GaussianPeakFit2026_head(c.inOut<DBL>(0, c.n, Peak), Positions(c, 1),
+                                             Weights(c, 2), 1e-9, GuessOfPeak(c, 3), c.scalar(0),
+                                             c.scalar(1), c.scalar(2), c.scalar(3), Limit(c, 300),
+                                             0.0);
+         },
+         None,
+         {3, 8, 50, 1000}},
         {"GaussianPeakFitCoef_head",
          [](Call &c) {
              return GaussianPeakFitCoef_head(c.in<DBL>(0, c.n, Peak), Positions(c, 1),

@@ -2,6 +2,7 @@
 #define QX_FIT_TESTS_NIST_MODELS_H
 
 #include "fit/bounded_lm.h"
+#include "fit/nonlinear.h"
 
 #include <cmath>
 #include <fstream>
@@ -66,108 +67,155 @@ inline std::vector<NistSet> ReadNistSets(const std::string &path) {
     return sets;
 }
 
-typedef double (*NistValue)(double x, double second, const double *b);
+// A number with its derivative by one parameter.
+struct Dual {
+    double value, slope = 0.0;
+    Dual(double v) : value(v) {}
+    Dual(double v, double s) : value(v), slope(s) {}
+};
+inline Dual operator-(Dual a) { return {-a.value, -a.slope}; }
+inline Dual operator+(Dual a, Dual b) { return {a.value + b.value, a.slope + b.slope}; }
+inline Dual operator-(Dual a, Dual b) { return {a.value - b.value, a.slope - b.slope}; }
+inline Dual operator*(Dual a, Dual b) {
+    return {a.value * b.value, a.slope * b.value + a.value * b.slope};
+}
+inline Dual operator/(Dual a, Dual b) {
+    const double ratio = a.value / b.value;
+    return {ratio, (a.slope - ratio * b.slope) / b.value};
+}
+inline Dual exp(Dual a) {
+    const double e = std::exp(a.value);
+    return {e, e * a.slope};
+}
+inline Dual log(Dual a) { return {std::log(a.value), a.slope / a.value}; }
+inline Dual pow(Dual a, Dual b) { return exp(b * log(a)); }
+inline Dual pow(double a, Dual b) { return exp(b * Dual(std::log(a))); }
+inline Dual sqrt(Dual a) {
+    const double root = std::sqrt(a.value);
+    return {root, a.slope / (2.0 * root)};
+}
+inline Dual sin(Dual a) { return {std::sin(a.value), std::cos(a.value) * a.slope}; }
+inline Dual cos(Dual a) { return {std::cos(a.value), -std::sin(a.value) * a.slope}; }
+inline Dual atan(Dual a) { return {std::atan(a.value), a.slope / (1.0 + a.value * a.value)}; }
 
-inline double Peaks(double x, const double *b) {
-    const double z1 = (x - b[3]) / b[4], z2 = (x - b[6]) / b[7];
-    return b[0] * std::exp(-b[1] * x) + b[2] * std::exp(-z1 * z1) + b[5] * std::exp(-z2 * z2);
+// A model for numbers and for numbers with their derivatives, from one text.
+struct NistModel {
+    double (*value)(double x, double second, const double *b);
+    Dual (*dual)(double x, double second, const Dual *b);
+    template <class Text>
+    NistModel(Text)
+        : value([](double x, double second, const double *b) { return Text{}(x, second, b); }),
+          dual([](double x, double second, const Dual *b) { return Text{}(x, second, b); }) {}
+};
+
+template <class T>
+T Peaks(double x, const T *b) {
+    using std::exp;
+    const T z1 = (x - b[3]) / b[4], z2 = (x - b[6]) / b[7];
+    return b[0] * exp(-b[1] * x) + b[2] * exp(-z1 * z1) + b[5] * exp(-z2 * z2);
 }
-inline double Lanczos(double x, const double *b) {
-    return b[0] * std::exp(-b[1] * x) + b[2] * std::exp(-b[3] * x) + b[4] * std::exp(-b[5] * x);
+template <class T>
+T Lanczos(double x, const T *b) {
+    using std::exp;
+    return b[0] * exp(-b[1] * x) + b[2] * exp(-b[3] * x) + b[4] * exp(-b[5] * x);
 }
-inline double Cubics(double x, const double *b) {
+template <class T>
+T Cubics(double x, const T *b) {
     return (b[0] + x * (b[1] + x * (b[2] + x * b[3]))) / (1 + x * (b[4] + x * (b[5] + x * b[6])));
 }
-inline double Wave(double x, double period, double cosine, double sine) {
-    const double phase = 2 * std::numbers::pi * x / period;
-    return cosine * std::cos(phase) + sine * std::sin(phase);
+template <class T>
+T Wave(double x, T period, T cosine, T sine) {
+    using std::cos;
+    using std::sin;
+    const T phase = 2 * std::numbers::pi * x / period;
+    return cosine * cos(phase) + sine * sin(phase);
 }
 
-inline const std::map<std::string, NistValue> &NistValues() {
-    static const NistValue chwirut = [](double x, double, const double *b) {
-        return std::exp(-b[0] * x) / (b[1] + b[2] * x);
+inline const std::map<std::string, NistModel> &NistModels() {
+    using std::atan;
+    using std::exp;
+    using std::pow;
+    using std::sqrt;
+    static const NistModel chwirut = [](double x, double, const auto *b) {
+        return exp(-b[0] * x) / (b[1] + b[2] * x);
     };
-    static const NistValue saturation = [](double x, double, const double *b) {
-        return b[0] * (1 - std::exp(-b[1] * x));
+    static const NistModel saturation = [](double x, double, const auto *b) {
+        return b[0] * (1 - exp(-b[1] * x));
     };
-    static const NistValue peaks = [](double x, double, const double *b) { return Peaks(x, b); };
-    static const NistValue lanczos = [](double x, double, const double *b) {
-        return Lanczos(x, b);
-    };
-    static const NistValue cubics = [](double x, double, const double *b) { return Cubics(x, b); };
-    static const std::map<std::string, NistValue> values = {
+    static const NistModel peaks = [](double x, double, const auto *b) { return Peaks(x, b); };
+    static const NistModel lanczos = [](double x, double, const auto *b) { return Lanczos(x, b); };
+    static const NistModel cubics = [](double x, double, const auto *b) { return Cubics(x, b); };
+    static const std::map<std::string, NistModel> models = {
         {"Bennett5",
-         [](double x, double, const double *b) { return b[0] * std::pow(b[1] + x, -1 / b[2]); }},
+         [](double x, double, const auto *b) { return b[0] * pow(b[1] + x, -1 / b[2]); }},
         {"BoxBOD", saturation},
         {"Chwirut1", chwirut},
         {"Chwirut2", chwirut},
-        {"DanWood", [](double x, double, const double *b) { return b[0] * std::pow(x, b[1]); }},
+        {"DanWood", [](double x, double, const auto *b) { return b[0] * pow(x, b[1]); }},
         {"ENSO",
-         [](double x, double, const double *b) {
-             return b[0] + Wave(x, 12, b[1], b[2]) + Wave(x, b[3], b[4], b[5]) +
+         [](double x, double, const auto *b) {
+             typedef std::decay_t<decltype(b[0])> T;
+             return b[0] + Wave(x, T(12), b[1], b[2]) + Wave(x, b[3], b[4], b[5]) +
                     Wave(x, b[6], b[7], b[8]);
          }},
         {"Eckerle4",
-         [](double x, double, const double *b) {
-             const double z = (x - b[2]) / b[1];
-             return b[0] / b[1] * std::exp(-0.5 * z * z);
+         [](double x, double, const auto *b) {
+             const auto z = (x - b[2]) / b[1];
+             return b[0] / b[1] * exp(-0.5 * z * z);
          }},
         {"Gauss1", peaks},
         {"Gauss2", peaks},
         {"Gauss3", peaks},
         {"Hahn1", cubics},
         {"Kirby2",
-         [](double x, double, const double *b) {
+         [](double x, double, const auto *b) {
              return (b[0] + x * (b[1] + x * b[2])) / (1 + x * (b[3] + x * b[4]));
          }},
         {"Lanczos1", lanczos},
         {"Lanczos2", lanczos},
         {"Lanczos3", lanczos},
         {"MGH09",
-         [](double x, double, const double *b) {
+         [](double x, double, const auto *b) {
              return b[0] * (x * x + x * b[1]) / (x * x + x * b[2] + b[3]);
          }},
-        {"MGH10",
-         [](double x, double, const double *b) { return b[0] * std::exp(b[1] / (x + b[2])); }},
+        {"MGH10", [](double x, double, const auto *b) { return b[0] * exp(b[1] / (x + b[2])); }},
         {"MGH17",
-         [](double x, double, const double *b) {
-             return b[0] + b[1] * std::exp(-x * b[3]) + b[2] * std::exp(-x * b[4]);
+         [](double x, double, const auto *b) {
+             return b[0] + b[1] * exp(-x * b[3]) + b[2] * exp(-x * b[4]);
          }},
         {"Misra1a", saturation},
         {"Misra1b",
-         [](double x, double, const double *b) {
-             const double half = 1 + b[1] * x / 2;
+         [](double x, double, const auto *b) {
+             const auto half = 1 + b[1] * x / 2;
              return b[0] * (1 - 1 / (half * half));
          }},
-        {"Misra1c", [](double x, double,
-                       const double *b) { return b[0] * (1 - 1 / std::sqrt(1 + 2 * b[1] * x)); }},
+        {"Misra1c",
+         [](double x, double, const auto *b) { return b[0] * (1 - 1 / sqrt(1 + 2 * b[1] * x)); }},
         {"Misra1d",
-         [](double x, double, const double *b) { return b[0] * b[1] * x / (1 + b[1] * x); }},
+         [](double x, double, const auto *b) { return b[0] * b[1] * x / (1 + b[1] * x); }},
         // of ln y
         {"Nelson", [](double x, double second,
-                      const double *b) { return b[0] - b[1] * x * std::exp(-b[2] * second); }},
+                      const auto *b) { return b[0] - b[1] * x * exp(-b[2] * second); }},
         {"Rat42",
-         [](double x, double, const double *b) { return b[0] / (1 + std::exp(b[1] - b[2] * x)); }},
-        {"Rat43",
-         [](double x, double, const double *b) {
-             return b[0] / std::pow(1 + std::exp(b[1] - b[2] * x), 1 / b[3]);
-         }},
+         [](double x, double, const auto *b) { return b[0] / (1 + exp(b[1] - b[2] * x)); }},
+        {"Rat43", [](double x, double,
+                     const auto *b) { return b[0] / pow(1 + exp(b[1] - b[2] * x), 1 / b[3]); }},
         {"Roszman1",
-         [](double x, double, const double *b) {
-             return b[0] - b[1] * x - std::atan(b[2] / (x - b[3])) / std::numbers::pi;
+         [](double x, double, const auto *b) {
+             return b[0] - b[1] * x - atan(b[2] / (x - b[3])) / std::numbers::pi;
          }},
         {"Thurber", cubics},
     };
-    return values;
+    return models;
 }
 
 // A set as the iteration takes it.
 struct NistProblem {
     const NistSet &set;
-    NistValue value;
+    NistModel functions;
     std::vector<double> number, target;
 
-    explicit NistProblem(const NistSet &of) : set(of), value(NistValues().at(of.name)) {
+    explicit NistProblem(const NistSet &of) : set(of), functions(NistModels().at(of.name)) {
         for (std::size_t i = 0; i < set.y.size(); ++i) {
             number.push_back(static_cast<double>(i));
             target.push_back(set.name == "Nelson" ? std::log(set.y[i]) : set.y[i]);
@@ -181,7 +229,7 @@ struct NistProblem {
                     for (int32_t j = 0; j < count; ++j)
                         b[j] = p[j];
                     const auto i = static_cast<std::size_t>(x);
-                    return self.value(self.set.x[i], self.set.second[i], b);
+                    return self.functions.value(self.set.x[i], self.set.second[i], b);
                 },
                 nullptr, nullptr, this};
     }
@@ -200,6 +248,52 @@ struct NistProblem {
         BoundedLM(model(), samples(), leastSquares, {}, p.data(), &iterations, 1e-15, &lambda,
                   &mse);
         return {digits({p.begin(), p.end()}), mse * static_cast<double>(target.size()), iterations};
+    }
+    // By the trust region, with derivatives or by differences.
+    NonlinearResult fit(int start, bool withDerivatives, std::vector<double> *parameters,
+                        double tolerance = 0.0, const RealMatrix &covariance = {}) const {
+        const auto values = [](const void *user, const DBL *p, DBL *out) {
+            const NistProblem &self = *static_cast<const NistProblem *>(user);
+            const std::vector<double> b(p, p + self.set.certified.size());
+            for (std::size_t i = 0; i < self.target.size(); ++i)
+                out[i] = self.functions.value(self.set.x[i], self.set.second[i], b.data());
+            return int32_t{0};
+        };
+        const auto jacobian = [](const void *user, const DBL *p, DBL *out) {
+            const NistProblem &self = *static_cast<const NistProblem *>(user);
+            const std::size_t count = self.set.certified.size();
+            std::vector<Dual> b(p, p + count);
+            for (std::size_t j = 0; j < count; ++j) {
+                b[j].slope = 1.0;
+                for (std::size_t i = 0; i < self.target.size(); ++i)
+                    out[i * count + j] =
+                        self.functions.dual(self.set.x[i], self.set.second[i], b.data()).slope;
+                b[j].slope = 0.0;
+            }
+            return int32_t{0};
+        };
+        NonlinearFit request;
+        request.model = {static_cast<int32_t>(set.certified.size()), values, nullptr, this};
+        if (withDerivatives)
+            request.model.jacobian = jacobian;
+        request.y = samples().y;
+        request.tolerance = tolerance;
+        request.limit = 10000;
+        std::vector<DBL> p(set.starts[start].begin(), set.starts[start].end());
+        NonlinearResult result;
+        result.p = {p.data(), static_cast<std::ptrdiff_t>(p.size())};
+        result.covariance = covariance;
+        FitNonlinear(request, &result);
+        parameters->assign(p.begin(), p.end());
+        return result;
+    }
+    double squares(const std::vector<double> &p) const {
+        double sum = 0;
+        for (std::size_t i = 0; i < target.size(); ++i) {
+            const double r = target[i] - functions.value(set.x[i], set.second[i], p.data());
+            sum += r * r;
+        }
+        return sum;
     }
     // The digits to which all parameters agree with the certified ones, of the 11 that there are.
     double digits(const std::vector<double> &p) const {

@@ -1,0 +1,1 @@
+qx_bench(fit_nonlinear SOURCES fit_nonlinear.cpp PEERS gsl)
