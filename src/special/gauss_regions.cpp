@@ -12,6 +12,7 @@ namespace qx {
 namespace {
 
 constexpr double kConnectionFrom = 0.9;
+constexpr double kFarthest = -1e280; // beyond, 1 / (1 - x) has not the digits of two doubles
 constexpr double kGoodConnection = 1e-13;
 constexpr double kGoodParts = 1e-27;
 constexpr double kAside = 0x1p-32;
@@ -127,9 +128,12 @@ double GaussByRegion(double x, double a, double b, double c) {
     const auto endsBefore = [&](double p) { return Ends(Whole(p)) && p > c; };
     if (Ends(Whole(c)) && !endsBefore(a) && !endsBefore(b))
         return kInfinity;
+    const bool ends = Ends(Whole(a)) || Ends(Whole(b));
     if (a == 0 || b == 0 || x == 0)
         return 1;
-    if (x == 1 && !Ends(Whole(a)) && !Ends(Whole(b)) && !((ExactSum(c, -a) - Whole(b)).high > 0))
+    if (x == 1 && !ends && !((ExactSum(c, -a) - Whole(b)).high > 0))
+        return kNaN;
+    if (x < kFarthest && !ends)
         return kNaN;
     const Estimated value = ByRegion({Whole(a), Whole(b), Whole(c)}, x);
     return value.error <= kHyperAccepted ? value.value.rounded() : kNaN;

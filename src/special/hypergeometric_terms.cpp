@@ -112,7 +112,8 @@ Scan SumOf(const HyperTerms &terms, int most, double tolerance) {
             exponent += kBigExponent;
         }
         const double quotient = std::max(ratio, end);
-        if (quotient < 1 && size * quotient <= tolerance * std::fabs(Leading(sum)) * (1 - quotient) &&
+        if (quotient < 1 &&
+            size * quotient <= tolerance * std::fabs(Leading(sum)) * (1 - quotient) &&
             IsPast(terms, k))
             return {ToPair(sum), roundings, exponent, largest, true};
     }
@@ -139,7 +140,8 @@ Estimated Careful(const HyperTerms &terms, double largest, double tolerance) {
     const bool isKnown = error < 0.1;
     const double lost = isKnown ? std::log2(pair.roundings / std::fabs(pair.sum.high)) : 110;
     Estimated best = isKnown ? Result(pair, error, one) : None();
-    for (int bits = static_cast<int>(lost - std::log2(tolerance)) + kSpareBits; bits < 2000; bits *= 2) {
+    for (int bits = static_cast<int>(lost - std::log2(tolerance)) + kSpareBits; bits < 2000;
+         bits *= 2) {
         const Estimated exact = IntegerSum(terms, std::max(largest, pair.largest), bits);
         if (exact.error < best.error)
             best = exact;

@@ -28,7 +28,7 @@ struct HyperForm {
 // 9e-15. Else by the form whose terms exceed the value least: in two doubles where these hold its
 // digits, and otherwise in integers of as many digits as cancel. The error is rounding alone; what the
 // terms behind the last add is below it. No value where 10000 terms in double precision, 4000 in two
-// doubles or, in integers, the time of a millisecond do not suffice.
+// doubles or, in integers, the time of some milliseconds do not suffice.
 Estimated BestForm(const HyperForm *forms, int count);
 
 // The sum of one series in two doubles, or in integers where the error of that is above the tolerance.

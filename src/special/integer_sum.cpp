@@ -13,7 +13,7 @@ namespace {
 constexpr int kWordBits = 32;
 constexpr int kMostWords = 40;       // of a term
 constexpr int kFactorWords = 8;      // of a parameter, with the number of the term added
-constexpr double kMostWork = 150000; // words of all terms, about a millisecond
+constexpr double kMostWork = 100000; // words of all terms, a few milliseconds
 constexpr int kMostBelow = 5;        // of them behind the point
 constexpr double kParameterLimit = 0x1p40;
 
@@ -50,6 +50,8 @@ public:
     // False where it has too many digits.
     bool set(Extended x) {
         exponent_ = 0;
+        if (!std::isfinite(x.high) || !std::isfinite(x.low))
+            return false;
         for (const double part : {x.high, x.low})
             if (part != 0)
                 exponent_ = std::min(exponent_, lowestWord(part));
@@ -171,7 +173,8 @@ void Divide(Term &term, Factor by, int words) {
         by.word[0] <<= shift;
     }
     const int steps = std::max(words + 1, term.length - m + 1);
-    uint32_t rest[kMostWords + 5 * kFactorWords]; // the term with zeros below, normalised as `by` is
+    uint32_t
+        rest[kMostWords + 5 * kFactorWords]; // the term with zeros below, normalised as `by` is
     const int length = steps + m - 1;
     const int zeros = length - term.length;
     for (int i = 0; i < zeros; ++i)
@@ -200,7 +203,8 @@ void Divide(Term &term, Factor by, int words) {
         uint64_t borrow = 0;
         for (int i = 0; i < m; ++i) {
             carry += digit * by.word[i];
-            const uint64_t difference = static_cast<uint64_t>(at[i]) - (carry & 0xFFFFFFFFU) - borrow;
+            const uint64_t difference =
+                static_cast<uint64_t>(at[i]) - (carry & 0xFFFFFFFFU) - borrow;
             at[i] = static_cast<uint32_t>(difference);
             borrow = difference >> 63;
             carry >>= kWordBits;
@@ -280,9 +284,9 @@ public:
         Extended sum = {0, 0};
         const int lowest = std::max(0, top - 3);
         for (int i = top; i >= lowest; --i)
-            sum = sum + Extended{std::ldexp(static_cast<double>(difference[i]),
-                                            kWordBits * (i - lowest)),
-                                 0};
+            sum = sum +
+                  Extended{std::ldexp(static_cast<double>(difference[i]), kWordBits * (i - lowest)),
+                           0};
         if (isNegative)
             sum = -sum;
         const Wide value = WideOf(sum, kWordBits * (exponent_ + lowest));

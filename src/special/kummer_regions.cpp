@@ -26,8 +26,8 @@ Estimated GammaRatio(Extended b, Extended a) {
 Estimated Part(Extended b, Extended a, double scale, double x, Extended power,
                const AsymptoticResult &sum) {
     const Estimated quotient = GammaRatio(b, a);
-    const Wide value = quotient.value * WideExp(Whole(scale) + power * LogOf(Whole(x))) *
-                       WideOf(Whole(sum.sum));
+    const Wide value =
+        quotient.value * WideExp(Whole(scale) + power * LogOf(Whole(x))) * WideOf(Whole(sum.sum));
     return {value, sum.error + quotient.error};
 }
 
@@ -37,8 +37,10 @@ Estimated Asymptotic(double a, double b, double x) {
     const double e = 1 - d.high; // 1 + a - b
     // for x < 0 as exp(x) M(b - a, b, -x), which exchanges the two parts
     const bool isTurned = x < 0;
-    const AsymptoticResult rising = isTurned ? AsymptoticSum(a, e, 1 / y) : AsymptoticSum(d.high, 1 - a, 1 / y);
-    const AsymptoticResult falling = isTurned ? AsymptoticSum(d.high, 1 - a, -1 / y) : AsymptoticSum(a, e, -1 / y);
+    const AsymptoticResult rising =
+        isTurned ? AsymptoticSum(a, e, 1 / y) : AsymptoticSum(d.high, 1 - a, 1 / y);
+    const AsymptoticResult falling =
+        isTurned ? AsymptoticSum(d.high, 1 - a, -1 / y) : AsymptoticSum(a, e, -1 / y);
     const Extended p = isTurned ? d : Whole(a);
     const Extended q = isTurned ? Whole(a) : d;
     const Estimated first = Part(Whole(b), p, isTurned ? 0 : x, y, -q, rising);
@@ -102,7 +104,8 @@ double KummerByRegion(double x, double a, double b) {
     }
     const Wide one = {Whole(0.5), 1};
     const HyperForm straight = {{Whole(a), Whole(1), Whole(b), Whole(x), false}, one};
-    const HyperForm turned = {{ExactSum(b, -a), Whole(1), Whole(b), Whole(-x), false}, WideExp(Whole(x))};
+    const HyperForm turned = {{ExactSum(b, -a), Whole(1), Whole(b), Whole(-x), false},
+                              WideExp(Whole(x))};
     const bool isStraight = x > 0 || (a < 0 && b > a);
     const HyperForm forms[] = {isStraight ? straight : turned, isStraight ? turned : straight};
     const Estimated value = isPole ? BestForm(&straight, 1) : BestForm(forms, 2);

@@ -50,8 +50,8 @@ constexpr double kPrecision<Extended> = 0x1p-100;
 // Olver's relation of the falling solution to the growing one (Numerical solution of second-order
 // linear difference equations, 1967). 0 where it would be beyond kMostTerms.
 int FirstTerm(double a, double b, double x, bool isWeighted, double tolerance) {
-    double p = 1, step = 1;           // the growing solution
-    double product = 1, sum = 0;      // weight times quotient of the coefficients; of the terms
+    double p = 1, step = 1;      // the growing solution
+    double product = 1, sum = 0; // weight times quotient of the coefficients; of the terms
     for (int n = 1; n < kMostTerms; ++n) {
         const double at = a + n;
         const double below = at - b + 1;
@@ -91,21 +91,27 @@ struct Neighbours {
 template <class Number>
 Neighbours<Number> FromAbove(Extended a, Extended b, double x) {
     const double kept = std::floor(std::min(a.high - 1, a.high - b.high));
+    const Neighbours<Number> none = {{}, {}, kOne, 0, false};
+    if (!(kept < kMostTerms))
+        return none;
     const Extended first = a - Whole(kept);
     const double tolerance = 0.1 * kPrecision<Number>;
     const int byWeight = FirstTerm(first.high, b.high, x, true, tolerance);
     const int bySize = FirstTerm(a.high, b.high, x, false, tolerance);
     if (byWeight == 0 || bySize == 0)
-        return {{}, {}, kOne, 0, false};
+        return none;
     const int last = std::max(byWeight, bySize + static_cast<int>(kept));
-    const Number start = Of<Number>(first), excess = Of<Number>(first - b), point = Of<Number>(Whole(x));
-    Number f = Of<Number>(Whole(1)), d = f, sum = f, above = Of<Number>(Whole(0)), at = above, next = above;
+    const Number start = Of<Number>(first), excess = Of<Number>(first - b),
+                 point = Of<Number>(Whole(x));
+    Number f = Of<Number>(Whole(1)), d = f, sum = f, above = Of<Number>(Whole(0)), at = above,
+           next = above;
     Number product = f; // (first)_kept
     int downs = 0;      // of at and next more than of the sum
     for (int n = last; n > 0; --n) {
         const Number whole = Of<Number>(Whole(n));
         sum = sum * ((excess + whole) / whole);
-        d = ((excess + Of<Number>(Whole(n + 1.0))) * d + point * f) / (start + Of<Number>(Whole(n - 1.0)));
+        d = ((excess + Of<Number>(Whole(n + 1.0))) * d + point * f) /
+            (start + Of<Number>(Whole(n - 1.0)));
         above = f;
         f = f + d;
         sum = sum + f;
@@ -146,7 +152,8 @@ void KeepInRange(Number &u, Number &v, Wide &unit) {
 // The same for any a, b <= x + 1.
 template <class Number>
 Neighbours<Number> DownInA(Extended a, Extended b, double x) {
-    const double up = std::max(0.0, std::max(std::ceil(1 - a.high), std::ceil(b.high - a.high)) + 1);
+    const double up =
+        std::max(0.0, std::max(std::ceil(1 - a.high), std::ceil(b.high - a.high)) + 1);
     if (up > kMostSteps)
         return {{}, {}, kOne, 0, false};
     Neighbours<Number> u = FromAbove<Number>(a + Whole(up), b, x);
@@ -189,7 +196,8 @@ Estimated ByRecurrences(Extended a, Extended b, double x) {
             u.above = (Of<Number>(fall) * u.above + first * u.at) / point;
             u.at = u.at + u.above;
         } else {
-            const Number next = u.at + (Of<Number>(now) * u.at - Of<Number>(fall) * (u.at - u.above)) / point;
+            const Number next =
+                u.at + (Of<Number>(now) * u.at - Of<Number>(fall) * (u.at - u.above)) / point;
             u.above = next - u.at;
             u.at = next;
         }
@@ -224,7 +232,8 @@ Estimated Connection(Extended a, Extended b, double x) {
     const Wide first = firstFactor.value * m.value;
     const Estimated power = PowerOf(Whole(x), one - b);
     const Wide second = secondFactor.value * power.value * n.value;
-    return SumOfParts({first, m.error + firstFactor.error}, {second, n.error + secondFactor.error + power.error});
+    return SumOfParts({first, m.error + firstFactor.error},
+                      {second, n.error + secondFactor.error + power.error});
 }
 
 Estimated BesideIntegers(Extended a, Extended b, double x) {
@@ -247,11 +256,16 @@ double AtZero(double a, double b) {
         return std::isfinite(limit.error) ? limit.value.rounded() : kNaN;
     }
     if (ends) { // (-1)^n (b)_n
-        const Estimated product = GammaQuotientOf({ExactSum(b, -a), Whole(1)}, {Whole(b), Whole(1)});
-        return std::isfinite(product.error) ? (IsOdd(a) ? -product.value.rounded() : product.value.rounded()) : kNaN;
+        const Estimated product =
+            GammaQuotientOf({ExactSum(b, -a), Whole(1)}, {Whole(b), Whole(1)});
+        return std::isfinite(product.error)
+                   ? (IsOdd(a) ? -product.value.rounded() : product.value.rounded())
+                   : kNaN;
     }
     const WideGamma gamma = GammaOf(Whole(a));
-    return gamma.isPole || std::isinf(gamma.gamma.error) ? kNaN : std::copysign(kInfinity, gamma.gamma.value.value.high);
+    return gamma.isPole || std::isinf(gamma.gamma.error)
+               ? kNaN
+               : std::copysign(kInfinity, gamma.gamma.value.value.high);
 }
 
 Estimated ByRegion(Extended a, Extended b, double x) {

@@ -36,10 +36,21 @@ Extended ExpOfRest(Extended r) {
 
 // ln gamma(x) - ((x - 1/2) ln x - x + ln sqrt(2 pi)), x >= 30: the terms B_2k / (2k (2k - 1) x^(2k-1)).
 Extended StirlingSum(Extended x) {
-    constexpr double bernoulli[][2] = {
-        {1, 6},        {-1, 30},         {1, 42},      {-1, 30},           {5, 66},
-        {-691, 2730},  {7, 6},           {-3617, 510}, {43867, 798},       {-174611, 330},
-        {854513, 138}, {-236364091, 2730}, {8553103, 6}, {-23749461029.0, 870}, {8615841276005.0, 14322}};
+    constexpr double bernoulli[][2] = {{1, 6},
+                                       {-1, 30},
+                                       {1, 42},
+                                       {-1, 30},
+                                       {5, 66},
+                                       {-691, 2730},
+                                       {7, 6},
+                                       {-3617, 510},
+                                       {43867, 798},
+                                       {-174611, 330},
+                                       {854513, 138},
+                                       {-236364091, 2730},
+                                       {8553103, 6},
+                                       {-23749461029.0, 870},
+                                       {8615841276005.0, 14322}};
     const Extended inverse = Whole(1) / x;
     const Extended square = inverse * inverse;
     Extended power = inverse;

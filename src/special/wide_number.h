@@ -12,7 +12,7 @@ struct Wide {
     int exponent;
 
     bool isZero() const { return value.high == 0; }
-    double rounded() const; // rounded once; infinite or 0 beyond the range
+    double rounded() const;   // rounded once; infinite or 0 beyond the range
     double logarithm() const; // log2 |value 2^exponent|, to some digits; -infinity for 0
 };
 

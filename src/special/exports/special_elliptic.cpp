@@ -23,6 +23,13 @@ void QX_Elliptic1_85(double m, double phi, DBL *value, int32_t selector) {
     *value = selector == kComplete ? qx::EllipticK(m) : qx::EllipticF(phi, m);
 }
 
+void QX_Elliptic1_2026(double m, double phi, DBL *value, int32_t selector) {
+    if (selector == kComplete)
+        *value = qx::EllipticK(m);
+    else
+        *value = m == 1 ? qx::EllipticFOfOne(phi) : qx::EllipticF(phi, m);
+}
+
 void QX_Elliptic2(double m, double phi, DBL *value) {
     *value = std::isnan(phi) ? qx::EllipticE(m) : qx::EllipticE(phi, m);
 }

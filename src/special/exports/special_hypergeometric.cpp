@@ -3,6 +3,9 @@
 #include "qx/special_hypergeometric.h"
 
 #include "special/confluent.h"
+#include "special/gauss_regions.h"
+#include "special/kummer_regions.h"
+#include "special/tricomi_regions.h"
 
 void QX_Gauss(double x, double a, double b, double c, DBL *value) {
     *value = qx::Gauss(x, a, b, c, qx::kGaussPfaffBelow);
@@ -12,6 +15,18 @@ void QX_Gauss_2011(double x, double a, double b, double c, DBL *value) {
     *value = qx::Gauss(x, a, b, c, qx::kGauss2011PfaffBelow);
 }
 
+void QX_Gauss_2026(double x, double a, double b, double c, DBL *value) {
+    *value = qx::GaussByRegion(x, a, b, c);
+}
+
 void QX_Kummer(double x, double a, double b, DBL *value) { *value = qx::Kummer(x, a, b); }
 
 void QX_Tricomi(double x, double a, double b, DBL *value) { *value = qx::Tricomi(x, a, b); }
+
+void QX_Kummer_2026(double x, double a, double b, DBL *value) {
+    *value = qx::KummerByRegion(x, a, b);
+}
+
+void QX_Tricomi_2026(double x, double a, double b, DBL *value) {
+    *value = qx::TricomiByRegion(x, a, b);
+}
