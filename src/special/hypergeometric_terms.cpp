@@ -157,7 +157,9 @@ Estimated SumOfParts(const Estimated &a, const Estimated &b) {
     const Wide sum = a.value + b.value;
     const double size = sum.logarithm();
     const auto share = [&](const Estimated &part) {
-        return part.value.isZero() ? 0.0 : part.error * std::exp2(part.value.logarithm() - size);
+        if (part.value.isZero() || std::isinf(part.error))
+            return part.error;
+        return part.error * std::exp2(part.value.logarithm() - size);
     };
     return {sum, share(a) + share(b)};
 }

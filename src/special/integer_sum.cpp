@@ -11,7 +11,7 @@ namespace qx {
 namespace {
 
 constexpr int kWordBits = 32;
-constexpr int kMostWords = 40;       // of a term
+constexpr int kMostWords = 64;       // of a term
 constexpr int kFactorWords = 8;      // of a parameter, with the number of the term added
 constexpr double kMostWork = 100000; // words of all terms, a few milliseconds
 constexpr int kMostBelow = 5;        // of them behind the point

@@ -14,6 +14,7 @@ namespace {
 constexpr double kAsymptoticFrom = 30;
 constexpr double kGood = 40 * kEpsilon;
 constexpr int kMostTerms = 1000;
+constexpr double kHopeless = 1e30; // of the terms of an asymptotic sum
 
 Extended Whole(double x) { return {x, 0}; }
 
@@ -26,6 +27,8 @@ Estimated GammaRatio(Extended b, Extended a) {
 Estimated Part(Extended b, Extended a, double scale, double x, Extended power,
                const AsymptoticResult &sum) {
     const Estimated quotient = GammaRatio(b, a);
+    if (quotient.value.isZero())
+        return {quotient.value, 0};
     const Wide value =
         quotient.value * WideExp(Whole(scale) + power * LogOf(Whole(x))) * WideOf(Whole(sum.sum));
     return {value, sum.error + quotient.error};
@@ -79,7 +82,7 @@ AsymptoticResult AsymptoticSum(double p, double q, double y) {
         term *= ratio;
         sum += term;
         roundings += 2 * std::fabs(term);
-        if (!(roundings < 1e14 * std::fabs(sum)))
+        if (!(roundings < kHopeless))
             break;
     }
     return {sum, kInfinity};

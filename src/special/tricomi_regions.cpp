@@ -205,7 +205,9 @@ Estimated ByRecurrences(Extended a, Extended b, double x) {
     }
     const double size = std::fabs(Leading(u.at));
     const double amplitude = size + scale * std::fabs(Leading(u.above));
-    const double weight = 8 + std::sqrt(static_cast<double>(u.steps)) + up;
+    double weight = 8 + std::sqrt(static_cast<double>(u.steps)) + up;
+    if (up > 0 && a.high < 0) // the part that grows has a factor 1 / gamma(a)
+        weight += 0.1 * weight / std::fabs((a - Whole(std::rint(a.high))).high);
     return {u.unit * WideOf(Pair(u.at)), 4 * weight * kPrecision<Number> * amplitude / size};
 }
 
