@@ -64,10 +64,8 @@ Estimated NearOne(const GaussArguments &p, const Point &point) {
 // The two series of which one ends, c - a or c - b being 0, -1, -2, ...
 Estimated Euler(const GaussArguments &p, const Point &point) {
     const Extended d = p.c - p.a, e = p.c - p.b;
-    const Estimated power = PowerOf(point.rest, d - p.b);
-    const HyperForm form = {{d, e, p.c, point.x, true}, power.value};
-    const Estimated value = BestForm(&form, 1);
-    return {value.value, value.error + power.error};
+    const HyperForm form = {{d, e, p.c, point.x, true}, point.rest, d - p.b};
+    return BestForm(&form, 1);
 }
 
 Estimated BySeries(const GaussArguments &p, const Point &point) {
@@ -76,7 +74,7 @@ Estimated BySeries(const GaussArguments &p, const Point &point) {
     HyperForm forms[4];
     int count = 0;
     const auto add = [&](Extended a, Extended b, Extended at, Extended power) {
-        forms[count++] = {{a, b, p.c, at, true}, PowerOf(point.rest, power).value};
+        forms[count++] = {{a, b, p.c, at, true}, point.rest, power};
     };
     const auto addTurned = [&] {
         const Extended turned = -point.x / point.rest;
@@ -97,7 +95,7 @@ Estimated BySeries(const GaussArguments &p, const Point &point) {
 Estimated ByRegion(const GaussArguments &p, double x) {
     const Point point = {Whole(x), ExactSum(1, -x)};
     if (Ends(p.a) || Ends(p.b)) {
-        const HyperForm form = {{p.a, p.b, p.c, point.x, true}, kOne};
+        const HyperForm form = {{p.a, p.b, p.c, point.x, true}, Whole(0), Whole(0)};
         return BestForm(&form, 1);
     }
     const Extended d = p.c - p.a, e = p.c - p.b;

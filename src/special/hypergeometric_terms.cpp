@@ -24,7 +24,7 @@ struct Scan {
     Extended sum;
     double roundings; // what the terms weigh in the error of the sum, in units of the precision
     int exponent;
-    double largest; // log2 of the largest term
+    double peak; // the largest term
     bool isComplete;
 
     double error(double epsilon) const {
@@ -32,6 +32,7 @@ struct Scan {
         return isComplete && size > 0 ? epsilon * roundings / size : kInfinity;
     }
     double logOfRoundings() const { return exponent + std::log2(roundings); }
+    double largest() const { return exponent + std::log2(peak); }
 };
 
 double At(double parameter, double k) { return parameter + k; }
@@ -70,7 +71,7 @@ Scan SumOf(const HyperTerms &terms, int most, double tolerance) {
     const double end = terms.hasB ? std::fabs(terms.x.high) : 0; // of the ratios
     Number term = Of<Number>({1, 0});
     Number sum = term;
-    double roundings = 1, peak = 1, largest = 0;
+    double roundings = 1, peak = 1;
     int exponent = 0;
     int below = 0; // what the exponent of the term is lower
     for (int i = 0; i < most; ++i) {
@@ -78,14 +79,15 @@ Scan SumOf(const HyperTerms &terms, int most, double tolerance) {
         Number top = At(a, k) * x;
         if (terms.hasB)
             top = top * At(b, k);
-        term = term * top / (At(c, k) * Of<Number>({k + 1, 0}));
+        const Number quotient = top / (At(c, k) * Of<Number>({k + 1, 0}));
+        term = term * quotient;
         const double size = std::fabs(Leading(term));
-        const double ratio = std::fabs(Leading(top) / ((terms.c.high + k) * (k + 1)));
+        const double ratio = std::max(std::fabs(Leading(quotient)), end); // of the terms behind
         if (size == 0)
-            return {ToPair(sum), roundings, exponent, largest, Leading(top) == 0};
+            return {ToPair(sum), roundings, exponent, peak, Leading(top) == 0};
         if (size < kVanishing) { // may rise again behind the poles
-            if (IsPast(terms, k) && std::max(ratio, end) < 1)
-                return {ToPair(sum), roundings, exponent, largest, true};
+            if (IsPast(terms, k) && ratio < 1)
+                return {ToPair(sum), roundings, exponent, peak, true};
             term = Up(term);
             below += kBigExponent;
         }
@@ -97,11 +99,8 @@ Scan SumOf(const HyperTerms &terms, int most, double tolerance) {
             continue;
         }
         sum = sum + term;
-        roundings += size * std::sqrt(4 * k + 4);
-        if (size > peak) {
-            peak = size;
-            largest = std::max(largest, exponent + std::log2(size));
-        }
+        roundings += size * (2 + 0.2 * k); // more than the root of 4 k
+        peak = std::max(peak, size);
         if (!(size < kBig)) {
             if (!(size < kInfinity))
                 break;
@@ -111,38 +110,61 @@ Scan SumOf(const HyperTerms &terms, int most, double tolerance) {
             peak /= kBig;
             exponent += kBigExponent;
         }
-        const double quotient = std::max(ratio, end);
-        if (quotient < 1 &&
-            size * quotient <= tolerance * std::fabs(Leading(sum)) * (1 - quotient) &&
+        if (ratio < 1 && size * ratio <= tolerance * std::fabs(Leading(sum)) * (1 - ratio) &&
             IsPast(terms, k))
-            return {ToPair(sum), roundings, exponent, largest, true};
+            return {ToPair(sum), roundings, exponent, peak, true};
     }
-    return {ToPair(sum), roundings, exponent, largest, false};
+    return {ToPair(sum), roundings, exponent, peak, false};
 }
 
 Estimated None() { return {{{kNaN, 0}, 0}, kInfinity}; }
 
-Estimated Result(const Scan &scan, double error, const Wide &factor) {
-    return {WideOf(scan.sum, scan.exponent) * factor, error};
+Estimated Result(const Scan &scan, double error) {
+    return {WideOf(scan.sum, scan.exponent), error};
 }
 
-bool IsExact(const HyperTerms &t) {
-    return t.a.low == 0 && (!t.hasB || t.b.low == 0) && t.c.low == 0 && t.x.low == 0;
+// The sum in double precision is that of the parameters: no small a + k loses what is behind the double.
+bool IsDouble(const HyperTerms &t) {
+    const auto isDouble = [](Extended a) { return a.low == 0 || a.high > 0; };
+    return isDouble(t.a) && (!t.hasB || isDouble(t.b)) && isDouble(t.c);
+}
+
+bool HasFactor(const HyperForm &form) { return form.power.high != 0; }
+
+Estimated FactorOf(const HyperForm &form) {
+    return form.base.high == 0 ? Estimated{WideExp(form.power), 0} : PowerOf(form.base, form.power);
+}
+
+// The same in double precision, which corrects for what is behind the doubles; an infinite error beyond
+// a moderate range.
+Estimated QuickFactorOf(const HyperForm &form) {
+    const double p = form.power.high;
+    const bool isExp = form.base.high == 0;
+    const double power = isExp ? std::exp(p) : std::pow(form.base.high, p);
+    if (!(power > 1e-250 && power < 1e250))
+        return {{{kNaN, 0}, 0}, kInfinity};
+    const double rest =
+        isExp ? form.power.low
+              : p * (form.base.low / form.base.high) + form.power.low * std::log(form.base.high);
+    return {WideOf({power * (1 + rest), 0}), 2 * kEpsilon};
+}
+
+Estimated Times(const Estimated &a, const Estimated &b) {
+    return {a.value * b.value, a.error + b.error};
 }
 
 // The sum in two doubles, else in integers; `largest` from a scan of the series.
 Estimated Careful(const HyperTerms &terms, double largest, double tolerance) {
     const Scan pair = SumOf<Extended>(terms, kMostCarefulTerms, 0x1p-106);
     const double error = pair.error(kPairEpsilon);
-    const Wide one = {{0.5, 0}, 1};
     if (error <= tolerance)
-        return Result(pair, error, one);
+        return Result(pair, error);
     const bool isKnown = error < 0.1;
     const double lost = isKnown ? std::log2(pair.roundings / std::fabs(pair.sum.high)) : 110;
-    Estimated best = isKnown ? Result(pair, error, one) : None();
+    Estimated best = isKnown ? Result(pair, error) : None();
     for (int bits = static_cast<int>(lost - std::log2(tolerance)) + kSpareBits; bits < 2000;
          bits *= 2) {
-        const Estimated exact = IntegerSum(terms, std::max(largest, pair.largest), bits);
+        const Estimated exact = IntegerSum(terms, std::max(largest, pair.largest()), bits);
         if (exact.error < best.error)
             best = exact;
         if (best.error <= tolerance || std::isnan(exact.error))
@@ -180,19 +202,27 @@ Estimated BestForm(const HyperForm *forms, int count) {
     for (const HyperForm *form = forms; form < forms + count; ++form) {
         const Scan scan = SumOf<double>(form->terms, kMostTerms, 0x1p-60);
         const double error = scan.error(kEpsilon);
-        if (error <= kGoodDouble && IsExact(form->terms))
-            return Result(scan, error, form->factor);
-        const double size = scan.logOfRoundings() + form->factor.logarithm();
-        if (scan.isComplete && size < least) {
+        if (error <= kGoodDouble && IsDouble(form->terms)) {
+            const Estimated sum = Result(scan, error);
+            if (!HasFactor(*form))
+                return sum;
+            const Estimated factor = QuickFactorOf(*form);
+            return Times(sum, std::isinf(factor.error) ? FactorOf(*form) : factor);
+        }
+        if (!scan.isComplete)
+            continue;
+        const double factor = HasFactor(*form) ? FactorOf(*form).value.logarithm() : 0;
+        const double size = scan.logOfRoundings() + factor;
+        if (size < least) {
             best = form;
             least = size;
-            largest = scan.largest;
+            largest = scan.largest();
         }
     }
     if (best == nullptr)
         return None();
     const Estimated sum = Careful(best->terms, largest, kGoodPair);
-    return {sum.value * best->factor, sum.error};
+    return HasFactor(*best) ? Times(sum, FactorOf(*best)) : sum;
 }
 
 } // namespace qx

@@ -18,10 +18,10 @@ Estimated SumOfParts(const Estimated &a, const Estimated &b);
 // The straight line through a value at -1 and one at 1.
 Estimated Between(const Estimated &low, const Estimated &high, double at);
 
-// One form of a value: a factor times a sum.
+// One form of a value: a sum times base^power, or times exp(power) where the base is 0.
 struct HyperForm {
     HyperTerms terms;
-    Wide factor;
+    Extended base, power;
 };
 
 // The value by the first of its forms whose sum in double precision has an estimated error below

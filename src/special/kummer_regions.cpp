@@ -44,6 +44,8 @@ Estimated Asymptotic(double a, double b, double x) {
         isTurned ? AsymptoticSum(a, e, 1 / y) : AsymptoticSum(d.high, 1 - a, 1 / y);
     const AsymptoticResult falling =
         isTurned ? AsymptoticSum(d.high, 1 - a, -1 / y) : AsymptoticSum(a, e, -1 / y);
+    if (rising.error > kGood)
+        return {{Whole(kNaN), 0}, kInfinity};
     const Extended p = isTurned ? d : Whole(a);
     const Extended q = isTurned ? Whole(a) : d;
     const Estimated first = Part(Whole(b), p, isTurned ? 0 : x, y, -q, rising);
@@ -105,10 +107,10 @@ double KummerByRegion(double x, double a, double b) {
         if (value.error <= kGood)
             return value.value.rounded();
     }
-    const Wide one = {Whole(0.5), 1};
-    const HyperForm straight = {{Whole(a), Whole(1), Whole(b), Whole(x), false}, one};
-    const HyperForm turned = {{ExactSum(b, -a), Whole(1), Whole(b), Whole(-x), false},
-                              WideExp(Whole(x))};
+    const Extended none = Whole(0);
+    const HyperForm straight = {{Whole(a), Whole(1), Whole(b), Whole(x), false}, none, none};
+    const HyperForm turned = {
+        {ExactSum(b, -a), Whole(1), Whole(b), Whole(-x), false}, none, Whole(x)};
     const bool isStraight = x > 0 || (a < 0 && b > a);
     const HyperForm forms[] = {isStraight ? straight : turned, isStraight ? turned : straight};
     const Estimated value = isPole ? BestForm(&straight, 1) : BestForm(forms, 2);

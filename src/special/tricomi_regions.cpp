@@ -2,7 +2,9 @@
 
 #include "frame/constants.h"
 #include "special/extended.h"
+#include "special/gamma.h"
 #include "special/kummer_regions.h"
+#include "special/reciprocal_gamma.h"
 
 #include <algorithm>
 #include <cmath>
@@ -14,8 +16,12 @@ namespace {
 constexpr double kGood = 40 * kEpsilon;
 constexpr double kGoodRecurrence = 2e-13;
 constexpr double kGoodConnection = 4e-14;
+constexpr double kPlainError = 12 * kEpsilon;
 constexpr double kGoodParts = 1e-27;
 constexpr double kConnectionBelow = 1;
+constexpr double kConnectionFirst = 0.2;
+constexpr double kPlainBelow = 3, kPlainDistance = 0.05;
+constexpr double kPlain = 20; // parameters up to which the functions of doubles serve
 constexpr double kAside = 0x1p-32;
 constexpr int kMostTerms = 20000;
 constexpr int kMostSteps = 3000;
@@ -23,6 +29,7 @@ constexpr double kBig = 0x1p300;
 constexpr int kBigExponent = 300;
 
 Extended Whole(double x) { return {x, 0}; }
+bool Ends(Extended a) { return a.high <= 0 && a.low == 0 && IsInteger(a.high); }
 constexpr Wide kOne = {{0.5, 0}, 1};
 
 template <class Number>
@@ -50,16 +57,19 @@ constexpr double kPrecision<Extended> = 0x1p-100;
 // Olver's relation of the falling solution to the growing one (Numerical solution of second-order
 // linear difference equations, 1967). 0 where it would be beyond kMostTerms.
 int FirstTerm(double a, double b, double x, bool isWeighted, double tolerance) {
+    constexpr int stride = 8;    // from one term that is looked at to the next
     double p = 1, step = 1;      // the growing solution
     double product = 1, sum = 0; // weight times quotient of the coefficients; of the terms
     for (int n = 1; n < kMostTerms; ++n) {
         const double at = a + n;
         const double below = at - b + 1;
-        product *= (at - 1) / below * (isWeighted ? (a - b + n) / n : 1);
-        step = ((at - 1) * step + x * p) / below;
+        product *= isWeighted ? (at - 1) * (at - b) / (below * n) : (at - 1) / below;
+        step = ((at - 1) * step + x * p) * (1 / below);
         p += step;
+        if (n % stride != 0)
+            continue;
         const double term = product / p;
-        sum += term;
+        sum += stride * term;
         if (!std::isfinite(sum))
             return 0;
         if (term * n < tolerance * sum)
@@ -214,10 +224,10 @@ Estimated ByRecurrences(Extended a, Extended b, double x) {
 // a = -n, b >= 1: (-1)^n (b)_n M(-n, b, x).
 Estimated Polynomial(Extended a, Extended b, double x) {
     const Estimated factor = GammaQuotientOf({b - a, Whole(1)}, {b, Whole(1)});
-    const HyperForm form = {{a, Whole(1), b, Whole(x), false}, factor.value};
+    const HyperForm form = {{a, Whole(1), b, Whole(x), false}, Whole(0), Whole(0)};
     const Estimated value = BestForm(&form, 1);
     const Wide sign = {Whole(IsOdd(a.high) ? -0.5 : 0.5), 1};
-    return {value.value * sign, value.error + factor.error};
+    return {value.value * factor.value * sign, value.error + factor.error};
 }
 
 // Where b is not an integer: gamma(1 - b) / gamma(a - b + 1) M(a, b, x) +
@@ -236,6 +246,23 @@ Estimated Connection(Extended a, Extended b, double x) {
     const Wide second = secondFactor.value * power.value * n.value;
     return SumOfParts({first, m.error + firstFactor.error},
                       {second, n.error + secondFactor.error + power.error});
+}
+
+// The same in double precision for moderate parameters, b away from integers.
+Estimated PlainConnection(double a, double b, double x) {
+    const double d = a - b + 1;
+    if (!(std::fabs(a) <= kPlain && std::fabs(b) <= kPlain && std::fabs(d) <= kPlain))
+        return {kOne, kInfinity};
+    const HyperForm forms[] = {
+        {{Whole(a), Whole(1), Whole(b), Whole(x), false}, {0, 0}, {0, 0}},
+        {{Whole(d), Whole(1), Whole(2 - b), Whole(x), false}, {0, 0}, {0, 0}}};
+    const Estimated m = BestForm(forms, 1);
+    const Estimated n = BestForm(forms + 1, 1);
+    const double first = GammaFunction(1 - b) * ReciprocalGamma(d);
+    const double second = GammaFunction(b - 1) * ReciprocalGamma(a) * std::pow(x, 1 - b);
+    const double error = (kPlainError + kEpsilon * std::fabs(b)) / std::fabs(b - std::rint(b));
+    return SumOfParts({WideOf(Whole(first)) * m.value, m.error + error},
+                      {WideOf(Whole(second)) * n.value, n.error + error});
 }
 
 Estimated BesideIntegers(Extended a, Extended b, double x) {
@@ -270,24 +297,36 @@ double AtZero(double a, double b) {
                : std::copysign(kInfinity, gamma.gamma.value.value.high);
 }
 
+// For small x.
+Estimated Connected(Extended a, Extended b, double x) {
+    const Estimated plain = PlainConnection(a.high, b.high, x);
+    return plain.error <= kGoodConnection ? plain : BesideIntegers(a, b, x);
+}
+
+// b >= 1.
+Estimated FromLargeB(Extended a, Extended b, double x) {
+    if (Ends(a))
+        return Polynomial(a, b, x);
+    const Estimated value = ByRecurrences<double>(a, b, x);
+    return value.error <= kGoodRecurrence ? value : ByRecurrences<Extended>(a, b, x);
+}
+
 Estimated ByRegion(Extended a, Extended b, double x) {
     const bool isTurned = b.high < 1;
     const Extended first = isTurned ? a - b + Whole(1) : a;
-    const Extended second = isTurned ? Whole(2) - b : b;
-    const bool ends = first.high <= 0 && first.low == 0 && IsInteger(first.high);
     Estimated connected = {kOne, kInfinity};
-    if (x < kConnectionBelow && !ends)
-        connected = BesideIntegers(a, b, x);
+    if (x < kConnectionFirst && !Ends(first))
+        connected = Connected(a, b, x);
+    else if (x < kPlainBelow && std::fabs(b.high - std::rint(b.high)) > kPlainDistance)
+        connected = PlainConnection(a.high, b.high, x);
     if (connected.error <= kGoodConnection)
         return connected;
-    Estimated value = ends ? Polynomial(first, second, x) : ByRecurrences<double>(first, second, x);
-    if (!ends && !(value.error <= kGoodRecurrence))
-        value = ByRecurrences<Extended>(first, second, x);
-    if (x < kConnectionBelow && connected.error < value.error)
-        return connected;
+    Estimated value = FromLargeB(first, isTurned ? Whole(2) - b : b, x);
     if (isTurned)
         value.value = value.value * PowerOf(Whole(x), Whole(1) - b).value;
-    return value;
+    if (x >= kConnectionFirst && x < kConnectionBelow && !(value.error <= kHyperAccepted))
+        connected = Connected(a, b, x);
+    return connected.error < value.error ? connected : value;
 }
 
 } // namespace

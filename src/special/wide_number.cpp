@@ -4,7 +4,7 @@
 #include "special/logarithms.h"
 
 #include <cmath>
-#include <iterator>
+#include <cstddef>
 
 namespace qx {
 
@@ -19,52 +19,65 @@ constexpr double kLogError = 0x1p-90;
 
 Extended Whole(double x) { return {x, 0.0}; }
 
+// 1 / k! from k = 1 on, in twice the precision.
+constexpr Extended kInverseFactorials[] = {{0x1.0000000000000p+0, 0},
+                                           {0x1.0000000000000p-1, 0},
+                                           {0x1.5555555555555p-3, 0x1.5555555555555p-57},
+                                           {0x1.5555555555555p-5, 0x1.5555555555555p-59},
+                                           {0x1.1111111111111p-7, 0x1.1111111111111p-63},
+                                           {0x1.6c16c16c16c17p-10, -0x1.f49f49f49f49fp-65},
+                                           {0x1.a01a01a01a01ap-13, 0x1.a01a01a01a01ap-73},
+                                           {0x1.a01a01a01a01ap-16, 0x1.a01a01a01a01ap-76},
+                                           {0x1.71de3a556c734p-19, -0x1.c154f8ddc6c00p-73},
+                                           {0x1.27e4fb7789f5cp-22, 0x1.cbbc05b4fa99ap-76},
+                                           {0x1.ae64567f544e4p-26, -0x1.c062e06d1f209p-80},
+                                           {0x1.1eed8eff8d898p-29, -0x1.2aec959e14c06p-83},
+                                           {0x1.6124613a86d09p-33, 0x1.f28e0cc748ebep-87},
+                                           {0x1.93974a8c07c9dp-37, 0x1.05d6f8a2efd1fp-92},
+                                           {0x1.ae7f3e733b81fp-41, 0x1.1d8656b0ee8cbp-97}};
+
+// B_2k / (2k (2k - 1)), as many as x = 30 needs.
+constexpr Extended kStirling[] = {{0x1.5555555555555p-4, 0x1.5555555555555p-58},
+                                  {-0x1.6c16c16c16c17p-9, 0x1.f49f49f49f49fp-64},
+                                  {0x1.a01a01a01a01ap-11, 0x1.a01a01a01a01ap-71},
+                                  {-0x1.3813813813814p-11, 0x1.fb1fb1fb1fb20p-65},
+                                  {0x1.b951e2b18ff23p-11, 0x1.5c3a9ce01b952p-65},
+                                  {-0x1.f6ab0d9993c7dp-10, 0x1.f82553c999b0ep-64},
+                                  {0x1.a41a41a41a41ap-8, 0x1.0690690690690p-62},
+                                  {-0x1.e4286cb0f5398p-6, 0x1.1efcdab896745p-61},
+                                  {0x1.6fe96381e0680p-3, -0x1.79e2405a71f88p-61},
+                                  {-0x1.6476701181f3ap+0, 0x1.24246319da678p-56},
+                                  {0x1.ace44322ce006p+3, -0x1.62c2b1bbcdd32p-51},
+                                  {-0x1.39b2525cccc1bp+7, 0x1.52604768a30fcp-47},
+                                  {0x1.12234e81b4e82p+11, -0x1.2c5f92c5f92c6p-43},
+                                  {-0x1.1a198ae1c4ab8p+15, 0x1.4c012227b696ep-41},
+                                  {0x1.51a2089a6e11ap+19, 0x1.c219ee4fdc447p-36}};
+
+// c[0] + c[1] x + ..., the terms that count below the last bit of c[0] in double precision.
+template <std::size_t N>
+Extended Sum(const Extended (&c)[N], Extended x, std::size_t pairs) {
+    double tail = 0;
+    for (std::size_t k = N; k-- > pairs;)
+        tail = c[k].high + x.high * tail;
+    Extended sum = Whole(tail);
+    for (std::size_t k = pairs; k-- > 0;)
+        sum = c[k] + x * sum;
+    return sum;
+}
+
 // exp(r), |r| <= ln(2) / 2: the series of r / 16, squared four times.
 Extended ExpOfRest(Extended r) {
     const Extended t = {r.high / 16, r.low / 16};
-    Extended term = t, sum = t; // exp(t) - 1
-    for (double k = 2; k < 20; ++k) {
-        term = term * t / Whole(k);
-        sum = sum + term;
-        if (std::fabs(term.high) < 0x1p-112)
-            break;
-    }
-    for (int i = 0; i < 4; ++i) // (1 + e)^2 - 1
+    Extended sum = t * Sum(kInverseFactorials, t, 8); // exp(t) - 1
+    for (int i = 0; i < 4; ++i)                       // (1 + e)^2 - 1
         sum = sum * (sum + Whole(2));
     return sum + Whole(1);
 }
 
-// ln gamma(x) - ((x - 1/2) ln x - x + ln sqrt(2 pi)), x >= 30: the terms B_2k / (2k (2k - 1) x^(2k-1)).
+// ln gamma(x) - ((x - 1/2) ln x - x + ln sqrt(2 pi)), x >= 30.
 Extended StirlingSum(Extended x) {
-    constexpr double bernoulli[][2] = {{1, 6},
-                                       {-1, 30},
-                                       {1, 42},
-                                       {-1, 30},
-                                       {5, 66},
-                                       {-691, 2730},
-                                       {7, 6},
-                                       {-3617, 510},
-                                       {43867, 798},
-                                       {-174611, 330},
-                                       {854513, 138},
-                                       {-236364091, 2730},
-                                       {8553103, 6},
-                                       {-23749461029.0, 870},
-                                       {8615841276005.0, 14322}};
     const Extended inverse = Whole(1) / x;
-    const Extended square = inverse * inverse;
-    Extended power = inverse;
-    Extended sum = Whole(0);
-    double k = 2;
-    for (const auto &b : bernoulli) {
-        const Extended term = Whole(b[0]) / Whole(b[1] * k * (k - 1)) * power;
-        sum = sum + term;
-        if (std::fabs(term.high) < 0x1p-112)
-            break;
-        power = power * square;
-        k += 2;
-    }
-    return sum;
+    return inverse * Sum(kStirling, inverse * inverse, 6);
 }
 
 } // namespace
