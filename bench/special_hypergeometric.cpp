@@ -1,7 +1,10 @@
 #include "bench/special_rows.h"
 
 #include "special/confluent.h"
+#include "special/gauss_regions.h"
 #include "special/hypergeometric.h"
+#include "special/kummer_regions.h"
+#include "special/tricomi_regions.h"
 
 #ifdef QX_PEER_GSL
 #include <gsl/gsl_sf_hyperg.h>
@@ -68,9 +71,13 @@ Peers TricomiPeers(double b) {
 
 double OurGauss(double x, double b) { return Gauss(x, 0.7, b, 2.3, kGaussPfaffBelow); }
 double OurGauss2011(double x, double b) { return Gauss(x, 0.7, b, 2.3, kGauss2011PfaffBelow); }
+double Gauss2026(double x, double b) { return GaussByRegion(x, 0.7, b, 2.3); }
 double OurKummer(double x, double a) { return Kummer(x, a, 2.3); }
 double OurTricomi(double x, double a) { return Tricomi(x, a, 0.3); }
 double OurTricomiAtInteger(double x, double a) { return Tricomi(x, a, 2); }
+double Kummer2026(double x, double a) { return KummerByRegion(x, a, 2.3); }
+double Tricomi2026(double x, double a) { return TricomiByRegion(x, a, 0.3); }
+double Tricomi2026AtInteger(double x, double a) { return TricomiByRegion(x, a, 2); }
 
 } // namespace
 
@@ -87,6 +94,15 @@ std::vector<SpecialRow> SpecialHypergeometricRows() {
         {"Tricomi [0, 6]", 0, 6, 0.1, 3, OurTricomi, TricomiPeers(0.3)},
         {"Tricomi [6, 60]", 6, 60, 0.1, 3, OurTricomi, TricomiPeers(0.3)},
         {"Tricomi [0, 6], b = 2", 0, 6, 0.1, 3, OurTricomiAtInteger, TricomiPeers(2)},
+        {"Gauss [-1, -0.5], revision", -1, -0.5, 0.1, 3, Gauss2026, GaussPeers()},
+        {"Gauss [-0.5, 0.2], revision", -0.5, 0.2, 0.1, 3, Gauss2026, GaussPeers()},
+        {"Gauss [0.2, 0.99], revision", 0.2, 0.99, 0.1, 3, Gauss2026, GaussPeers()},
+        {"Kummer [-60, -10], a > 0, revision", -60, -10, 0.1, 5, Kummer2026, KummerPeers()},
+        {"Kummer [0, 30], a > 0, revision", 0, 30, 0.1, 5, Kummer2026, KummerPeers()},
+        {"Kummer [0, 30], a < 0, revision", 0, 30, -5, -0.1, Kummer2026, KummerPeers()},
+        {"Tricomi [0, 6], revision", 0, 6, 0.1, 3, Tricomi2026, TricomiPeers(0.3)},
+        {"Tricomi [6, 60], revision", 6, 60, 0.1, 3, Tricomi2026, TricomiPeers(0.3)},
+        {"Tricomi [0, 6], b = 2, revision", 0, 6, 0.1, 3, Tricomi2026AtInteger, TricomiPeers(2)},
     };
 }
 

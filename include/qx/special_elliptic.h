@@ -17,8 +17,15 @@ QX_BEGIN_DECLS
 QX_API void QX_Elliptic1(double m, double phi, QX_OUT DBL *value);
 
 /** As QX_Elliptic1, with a selector for what a NaN says there: 1 complete, otherwise incomplete.
+    F(phi, 1) has an absolute error of 1e-16 here, which is every digit for phi below that;
+    QX_Elliptic1_2026 keeps them.
     NaN: m in all results; phi in some results. */
 QX_API void QX_Elliptic1_85(double m, double phi, QX_OUT DBL *value, int32_t selector);
+
+/** As QX_Elliptic1_85, with F(phi, 1) = ln((1 + sin phi) / cos phi) to 3 eps: below a quarter of pi as
+    ln(1 + 2 t / (1 - t)), t = tan(phi / 2). Infinite from the double next to pi / 2 on.
+    NaN: m in all results; phi in some results. */
+QX_API void QX_Elliptic1_2026(double m, double phi, QX_OUT DBL *value, int32_t selector);
 
 /** Elliptic integral of the second kind: complete, E(m), where phi is NaN, else E(phi, m), the
     integral of (1 - m sin^2(t))^(1/2) from 0 to phi, by the same methods. NaN for m outside [0,

@@ -577,7 +577,7 @@ def ellipj(u: ArrayLike, m: ArrayLike) -> tuple[Any, Any, Any, Any]:
 
 
 def hyp2f1(a: ArrayLike, b: ArrayLike, c: ArrayLike, x: ArrayLike) -> Any:
-    r"""Gauss's hypergeometric function, for x from -1 to 1.
+    r"""Gauss's hypergeometric function, for x to 1.
 
     .. math:: {}_2F_1 = \sum_k \frac{(a)_k (b)_k}{(c)_k k!} x^k
 
@@ -586,7 +586,7 @@ def hyp2f1(a: ArrayLike, b: ArrayLike, c: ArrayLike, x: ArrayLike) -> Any:
     a, b, c : float or array_like
         The parameters.
     x : float or array_like
-        From -1 to 1.
+        At most 1.
 
     Returns
     -------

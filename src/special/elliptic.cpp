@@ -122,6 +122,20 @@ double EllipticF(double phi, double m) {
         [m](double size) { return Landen(size, m).first; });
 }
 
+double EllipticFOfOne(double phi) {
+    const auto nearZero = [](double size) {
+        const double t = std::tan(0.5 * size);
+        return std::log1p(2 * t / (1 - t));
+    };
+    return Incomplete(
+        phi, 1, EllipticK,
+        [nearZero](double size) {
+            return size < 0.25 * kPi ? nearZero(size)
+                                     : std::log((1 + std::sin(size)) / std::cos(size));
+        },
+        nearZero);
+}
+
 double EllipticE(double phi, double m) {
     return Incomplete(
         phi, m, EllipticE, [](double size) { return std::sin(size); },

@@ -15,6 +15,10 @@ double EllipticE(double m);
 double EllipticF(double phi, double m);
 double EllipticE(double phi, double m);
 
+// F(phi, 1), the inverse of the Gudermannian function, to the last digits of small angles and next to a
+// quarter turn; what EllipticF gives from a quarter turn on.
+double EllipticFOfOne(double phi);
+
 // Jacobi's sn, cn, dn and the amplitude. m < 1e-9 and m > 0.999999999: first-order forms about the
 // circular and the hyperbolic functions, the latter only while the second order stays below eps;
 // otherwise at most 8 arithmetic-geometric means and back through the amplitudes.

@@ -5,6 +5,7 @@
 #include "special/logarithms.h"
 #include "special/tables/normal.h"
 #include "special/tail_integrals.h"
+#include "stats/student_tail.h"
 
 #include <algorithm>
 #include <cmath>
@@ -14,6 +15,7 @@ namespace qx {
 namespace {
 
 constexpr double kMostDegrees = 1e25;
+constexpr double kLeastTail = 1e-250;
 constexpr double kFarStudent = 1e140;   // from there on the tail is a power of t to the last digit
 constexpr double kNearStudent = 1e-150; // up to there the tail is a half to the last digit
 
@@ -121,6 +123,9 @@ Tails SquareTails(double t, double dof) {
 Scaled UpperStudent(double t, double dof) {
     if (t < kNearStudent)
         return {0.5, Whole(0.0)};
+    const StudentTail quick = StudentTailAt(t, dof);
+    if (quick.isKnown)
+        return {quick.upper(), Whole(0.0)};
     if (t <= kFarStudent) {
         const Tails tails = SquareTails(t, dof);
         return tails.isLower ? Scaled{0.5 - 0.5 * tails.smaller.value(), Whole(0.0)}
@@ -268,7 +273,11 @@ double StudentPoint(double p, bool isUpper, double dof) {
     TakeSmaller(p, isUpper);
     if (p == 0.5)
         return 0.0;
-    double t;
+    double t = kNaN;
+    if (dof >= 1.0 && dof < kMostDegrees && p > kLeastTail)
+        t = StudentUpperPoint(p, dof, UpperNormalPoint(p));
+    if (!std::isnan(t))
+        return isUpper ? t : -t;
     const Scaled far = UpperStudent(kFarStudent, dof);
     if (far.value() > p) {
         const Extended log = far.exponent + LogOf(Whole(far.factor)) - LogOf(Whole(p));

@@ -54,7 +54,15 @@ GAUSS = [("x in [-1, -0.5], |a|, |b| < 3, c in [0.1, 4]",
          ("a = 0 ... -12, x in [-1, 1]", boxes(60, (-1, 1), [-float(k) for k in range(13)], (-5, 5), (0.1, 5))),
          ("c - a = 0 ... -6, x in [-1, 0.99]", [(x, c + k, b, c) for x, k, b, c in
                                                 boxes(60, (-1, 0.99), [float(k) for k in range(7)], (-3, 3), SIMPLE)]),
-         ("|a|, |b| < 20, c in [-20, 20], x in [-1, 0.2]", boxes(60, (-1, 0.2), (-20, 20), (-20, 20), (-20, 20)))]
+         ("|a|, |b| < 20, c in [-20, 20], x in [-1, 0.2]", boxes(60, (-1, 0.2), (-20, 20), (-20, 20), (-20, 20))),
+         ("|a|, |b| < 100, c in [-100, 100], x in [-1, 1]", boxes(60, (-1, 1), (-100, 100), (-100, 100), (-100, 100)))]
+FAR = [("x in [-100, -1], |a|, |b| < 3, c in [0.1, 4]", gauss_box(-100, -1)),
+       ("x in [-100, -1], |a|, |b| < 100, c in [-100, 100]",
+        boxes(60, (-100, -1), (-100, 100), (-100, 100), (-100, 100))),
+       ("x in [-100, -1], b - a = 0, 1, 2",
+        [(x, a, a + m, c) for x, a, m, c in boxes(60, (-100, -1), SIMPLE, [0.0, 1.0, 2.0], (0.1, 4))]),
+       ("x in [-1e8, -100], |a|, |b| < 3, c in [0.1, 4]",
+        [(-10**e, a, b, c) for e, a, b, c in gauss_box(2, 8)])]
 
 KUMMER = [("x in [-1, 1], |a| < 3, b in [0.1, 5]", boxes(60, (-1, 1), (-3, 3), (0.1, 5))),
           ("x in [-10, -1], a in [0.1, 5], b in [0.1, 5]", boxes(60, (-10, -1), (0.1, 5), (0.1, 5))),
@@ -67,7 +75,8 @@ KUMMER = [("x in [-1, 1], |a| < 3, b in [0.1, 5]", boxes(60, (-1, 1), (-3, 3), (
           ("x in [25, 700], the same", boxes(60, (25, 700), (-5, -0.1), (0.1, 5))),
           ("x in [-50, -1], a in [-5, -0.1], b in [0.1, 5]", boxes(60, (-50, -1), (-5, -0.1), (0.1, 5))),
           ("x in [-20, 20], |a| < 20, b in [-20, 20]", boxes(60, (-20, 20), (-20, 20), (-20, 20))),
-          ("x in [-100, 100], |a|, |b| < 30", boxes(60, (-100, 100), (-30, 30), (-30, 30)))]
+          ("x in [-100, 100], |a|, |b| < 30", boxes(60, (-100, 100), (-30, 30), (-30, 30))),
+          ("x in [-100, 100], |a|, |b| < 100", boxes(60, (-100, 100), (-100, 100), (-100, 100)))]
 
 TRICOMI = [("x in [0, 1], |a| < 2, b in [-2, 2]", boxes(60, (0.001, 1), (-2, 2), (-2, 2))),
            ("x in [1, 3], the same", boxes(60, (1, 3), (-2, 2), (-2, 2))),
@@ -82,7 +91,9 @@ TRICOMI = [("x in [0, 1], |a| < 2, b in [-2, 2]", boxes(60, (0.001, 1), (-2, 2),
            ("x in [0, 6], |a| < 10, b in [-10, 10]", boxes(60, (0.001, 6), (-10, 10), (-10, 10))),
            ("x in [6, 100], the same", boxes(60, (6, 100), (-10, 10), (-10, 10))),
            ("a = 0 ... -9, x in [6, 100], |b| < 5",
-            boxes(60, (6, 100), [-float(k) for k in range(10)], (-5, 5)))]
+            boxes(60, (6, 100), [-float(k) for k in range(10)], (-5, 5))),
+           ("x in [0.001, 100], |a|, |b| < 100", boxes(60, (0.001, 100), (-100, 100), (-100, 100))),
+           ("the same, whole b", boxes(60, (0.001, 100), (-100, 100), [float(k) for k in range(-50, 51)]))]
 
 
 def moved(function):
@@ -101,16 +112,26 @@ TRICOMI_NOTE = """The asymptotic sum begins at x = 6, where its smallest term is
 first, for |a (1 + a - b)| > x, no digit is left. Below 6 the difference of two M loses the digits
 that they grow by, and an integer b takes the mean of its neighbours at 0.0005, by design."""
 
+REVISION = "On the points of the elder."
+
 FUNCTIONS = [
     Function("QX_Gauss_2011", "ddddo", lambda x, a, b, c: mpmath.hyp2f1(a, b, c, x), GAUSS, GAUSS_PEERS,
              note=GAUSS_NOTE),
     Function("QX_Gauss", "ddddo", lambda x, a, b, c: mpmath.hyp2f1(a, b, c, x),
-             [GAUSS[1], GAUSS[10], GAUSS[-1]], GAUSS_PEERS,
+             [GAUSS[1], GAUSS[10], GAUSS[15]], GAUSS_PEERS,
              note="Where it takes another way than QX_Gauss_2011: the series itself on [-0.5, 0.2)."),
+    Function("QX_Gauss_2026", "ddddo", lambda x, a, b, c: mpmath.hyp2f1(a, b, c, x), GAUSS + FAR, GAUSS_PEERS,
+             note="On the points of QX_Gauss_2011, and below -1."),
     Function("QX_Kummer", "dddo", lambda x, a, b: mpmath.hyp1f1(a, b, x), KUMMER,
              {"GSL": moved(from_gsl("gsl_sf_hyperg_1F1", "ddd")), "SciPy": moved(from_scipy("hyp1f1"))},
              note=KUMMER_NOTE),
+    Function("QX_Kummer_2026", "dddo", lambda x, a, b: mpmath.hyp1f1(a, b, x), KUMMER,
+             {"GSL": moved(from_gsl("gsl_sf_hyperg_1F1", "ddd")), "SciPy": moved(from_scipy("hyp1f1"))},
+             note=REVISION),
     Function("QX_Tricomi", "dddo", lambda x, a, b: mpmath.hyperu(a, b, x), TRICOMI,
              {"GSL": moved(from_gsl("gsl_sf_hyperg_U", "ddd")), "SciPy": moved(from_scipy("hyperu"))},
              note=TRICOMI_NOTE),
+    Function("QX_Tricomi_2026", "dddo", lambda x, a, b: mpmath.hyperu(a, b, x), TRICOMI,
+             {"GSL": moved(from_gsl("gsl_sf_hyperg_U", "ddd")), "SciPy": moved(from_scipy("hyperu"))},
+             note=REVISION),
 ]

@@ -26,6 +26,14 @@ void QX_Elliptic1_85(double m, double phi, DBL *value, int32_t selector) {
     *value = selector == kComplete ? qx::EllipticK(m) : qx::EllipticF(phi, m);
 }
 
+void QX_Elliptic1_2026(double m, double phi, DBL *value, int32_t selector) {
+    const qx::DefaultArithmetic arithmetic;
+    if (selector == kComplete)
+        *value = qx::EllipticK(m);
+    else
+        *value = m == 1 ? qx::EllipticFOfOne(phi) : qx::EllipticF(phi, m);
+}
+
 void QX_Elliptic2(double m, double phi, DBL *value) {
     const qx::DefaultArithmetic arithmetic;
     *value = std::isnan(phi) ? qx::EllipticE(m) : qx::EllipticE(phi, m);

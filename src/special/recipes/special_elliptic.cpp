@@ -16,6 +16,15 @@ std::vector<Recipe> SpecialEllipticRecipes() {
              return 0;
          },
          NoStatus},
+        {"QX_Elliptic1_2026",
+         [](Call &c) {
+             QX_Elliptic1_2026(1.0 / c.n, 0.9 * c.n, c.scalar(0), 0);
+             QX_Elliptic1_2026(1.0 / c.n, 0.9, c.scalar(1), 1);
+             QX_Elliptic1_2026(1, 0.3 / c.n, c.scalar(2), 0);
+             QX_Elliptic1_2026(1, 1.5 - 0.2 / c.n, c.scalar(3), 0);
+             return 0;
+         },
+         NoStatus},
         OfTwoNumbers("QX_Elliptic2", QX_Elliptic2),
         {"QX_Elliptic2_85",
          [](Call &c) {

@@ -17,6 +17,7 @@ typedef const qx::test::Arguments &In;
 const qx::test::ExportMap &Exports() {
     static const qx::test::ExportMap exports = {
         {"Elliptic1", [](In a, double *o) { QX_Elliptic1(a[0], a[1], o); }},
+        {"Elliptic1_2026", [](In a, double *o) { QX_Elliptic1_2026(a[0], a[1], o, 0); }},
         {"Elliptic2", [](In a, double *o) { QX_Elliptic2(a[0], a[1], o); }},
         {"EllipticJ", [](In a, double *o) { QX_EllipticJ(a[0], a[1], o, o + 1, o + 2, o + 3); }},
     };
@@ -33,10 +34,11 @@ TEST(SpecialElliptic, AgreesWithReferencesOnBothSidesOfEachThreshold) {
 
 TEST(SpecialElliptic, KeepsTheRulesOfDomainsAndLimits) {
     const qx::test::Rule rules[] = {
-        {"Elliptic1", {-0.1, 1}, kNaN},      {"Elliptic1", {1.1, kNaN}, kNaN},
-        {"Elliptic1", {1, kNaN}, kInfinity}, {"Elliptic2", {1, kNaN}, 1},
-        {"Elliptic1", {0, 0.75}, 0.75},      {"Elliptic1", {0.5, 0}, 0},
-        {"EllipticJ", {1, 1.5}, kNaN},
+        {"Elliptic1", {-0.1, 1}, kNaN},        {"Elliptic1", {1.1, kNaN}, kNaN},
+        {"Elliptic1", {1, kNaN}, kInfinity},   {"Elliptic2", {1, kNaN}, 1},
+        {"Elliptic1", {0, 0.75}, 0.75},        {"Elliptic1", {0.5, 0}, 0},
+        {"EllipticJ", {1, 1.5}, kNaN},         {"Elliptic1_2026", {1, kNaN}, kNaN},
+        {"Elliptic1_2026", {1, 2}, kInfinity}, {"Elliptic1_2026", {1, -0.0}, 0},
     };
     for (const auto &rule : rules)
         qx::test::ExpectRule(Exports(), rule);
@@ -48,6 +50,8 @@ TEST(SpecialElliptic, SelectsTheCompleteForms) {
     EXPECT_EQ(complete, Value("Elliptic1", 0.3, kNaN));
     QX_Elliptic1_85(0.3, 0.5, &complete, 2); // anything but 1
     EXPECT_EQ(complete, Value("Elliptic1", 0.3, 0.5));
+    QX_Elliptic1_2026(1, 0.5, &complete, 1);
+    EXPECT_EQ(complete, kInfinity);
     QX_Elliptic2_85(0.3, 0.5, &complete, 1);
     EXPECT_EQ(complete, Value("Elliptic2", 0.3, kNaN));
     QX_Elliptic2_85(0.3, kNaN, &complete, 0); // here a NaN selects nothing

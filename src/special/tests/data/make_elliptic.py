@@ -25,3 +25,7 @@ for m in [1e-12, 0.3, 0.99, 1 - 2.0**-33, 1 - 2.0**-27, 1] + list(sides(1e-9, 0.
     for u in (-3.0, 0.2, 1.0, 9.0):
         for i, kind in enumerate(("sn", "cn", "dn")):
             row("EllipticJ", [u, m], i, mpmath.ellipfun(kind, mpf(u), m=mpf(m)), 17, 1)
+for phi in (1e-300, -1e-17, 1e-8, 0.3, 1.2, -1.5, 1.5707963) + tuple(sides(mpmath.pi / 4)):
+    row("Elliptic1_2026", [1, phi], 0, mpmath.atanh(mpmath.sin(mpf(phi))), 4)
+for phi in (-1.0, 3.0, 1.6):
+    row("Elliptic1_2026", [0.9, phi], 0, mpmath.ellipf(mpf(phi), mpf(0.9)), 9)

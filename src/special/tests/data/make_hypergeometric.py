@@ -4,6 +4,8 @@
 usage: make_hypergeometric.py > hypergeometric.dat
 """
 
+import random
+
 import mpmath
 from mpmath import mpf
 from reference import row, sides
@@ -94,3 +96,41 @@ for a, b in [(-4, 0.5), (-9, 2.25), (0.5, 4.5), (2.25, 7.25)]:  # sums that end
 for a, b in [(0.7, 1), (1.5, 2), (0.25, 3), (0.3, 0), (1.25, -2)]:  # the mean beside an integer
     for x in (0.5, 2.0, 4.0):
         tricomi(x, a, b, 3.3e9)
+
+# The revisions over their regions, arguments as users have them: whole, half or any numbers; then integer
+# differences, the neighbours of thresholds, and sums that cancel hundreds of digits.
+random_ = random.Random(2026)
+
+
+def parameter(size):
+    x = random_.uniform(-size, size)
+    return random_.choice((x, x, float(round(x)), round(2 * x) / 2))
+
+
+def is_pole(b):
+    return b <= 0 and b == round(b)
+
+
+for size in [2.0] * 8 + [10.0] * 10 + [100.0] * 20:
+    a, b, c = (parameter(size) for _ in range(3))
+    for x in (random_.uniform(-100, 100), random_.uniform(-2, 2)):
+        if not is_pole(b):
+            row("Kummer_2026", [x, a, b], 0, mpmath.hyp1f1(mpf(a), mpf(b), mpf(x)), 200)
+        row("Tricomi_2026", [abs(x), a, b], 0, mpmath.hyperu(mpf(a), mpf(b), mpf(abs(x))), 2000)
+    for x in (random_.uniform(-1, 1), random_.uniform(-100, -1), 1 - 10**random_.uniform(-6, -1)):
+        if not is_pole(c):
+            gauss(x, a, b, c, 500, ["Gauss_2026"])
+for x, a, b in [(x, 30.25, 12.5) for x in sides(30, -30)] + [(-95, 99.5, 3), (60, -95.25, 2.5), (-3, -2, -7),
+                                                             (0.5, 40, -60.5), (-1e4, 2.5, 7), (300, 40, -9.75),
+                                                             # asymptotic sums that pass through 0
+                                                             (63, 3, 34.5), (52, -4, 10), (-36, 7, 1)]:
+    row("Kummer_2026", [x, a, b], 0, mpmath.hyp1f1(mpf(a), mpf(b), mpf(x)), 200)
+for x, a, b in [(x, a, b) for x in sides(1) for a in (0.75, -8.5) for b in (1, 2.25, -3)] + [
+        (0.01, 60, 2), (3, 90, 80.5), (3, -64, 57.5), (1e-6, 0.5, 1), (50, -90.5, 20), (0.2, -80.25, 95), (12, -40, 60),
+        (0.3, 2.5, 3 + 2.0**-40), (5.25, -66.5 - 2.0**-14, -56.5)]:
+    row("Tricomi_2026", [x, a, b], 0, mpmath.hyperu(mpf(a), mpf(b), mpf(x)), 2000)
+for x, a, b, c in [(x, 0.75, 1.5, c) for x in sides(0.9, -9, 0.4, -0.5, -0.95) for c in (2.25, 4.5)] + [
+        (0.95, 0.7, 1.25, 1.95 + 2.0**-40), (-50, 1.5, 3.5, 40), (-1e8, 0.5, 2.5, 1.25), (0.5, -60, 61, 1),
+        (-70, 11, 12, 39), (0.85, -71.5, 98.25, 11.5), (-3, -5, 2.5, -9), (-200, -40, 7.5, 2.5), (0.3, 6.5, 2, 2.5),
+        (1, 0.5, -1.25, 3), (0.9992, -79, 14, 2)]:
+    gauss(x, a, b, c, 500, ["Gauss_2026"])

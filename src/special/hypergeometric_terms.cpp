@@ -1,0 +1,228 @@
+#include "special/hypergeometric_terms.h"
+
+#include "frame/constants.h"
+
+#include <algorithm>
+#include <cmath>
+
+namespace qx {
+
+namespace {
+
+constexpr int kMostTerms = 10000;
+constexpr int kMostCarefulTerms = 4000;
+constexpr double kGoodDouble = 40 * kEpsilon;
+constexpr double kGoodPair = 4 * kEpsilon;
+constexpr double kPairEpsilon = 0x1p-100;
+constexpr double kBig = 0x1p300;
+constexpr int kBigExponent = 300;
+constexpr double kVanishing = 1e-250;
+constexpr int kSpareBits = 24;
+
+// What a scan of a series has found, in units of 2^exponent.
+struct Scan {
+    Extended sum;
+    double roundings; // what the terms weigh in the error of the sum, in units of the precision
+    int exponent;
+    double peak; // the largest term
+    bool isComplete;
+
+    double error(double epsilon) const {
+        const double size = std::fabs(sum.high);
+        return isComplete && size > 0 ? epsilon * roundings / size : kInfinity;
+    }
+    double logOfRoundings() const { return exponent + std::log2(roundings); }
+    double largest() const { return exponent + std::log2(peak); }
+};
+
+double At(double parameter, double k) { return parameter + k; }
+Extended At(Extended parameter, double k) {
+    const Extended sum = ExactSum(parameter.high, k);
+    return QuickSum(sum.high, sum.low + parameter.low);
+}
+double Leading(double x) { return x; }
+double Leading(Extended x) { return x.high; }
+template <class Number>
+Number Of(Extended x);
+template <>
+double Of<double>(Extended x) {
+    return x.high;
+}
+template <>
+Extended Of<Extended>(Extended x) {
+    return x;
+}
+Extended ToPair(double x) { return {x, 0}; }
+Extended ToPair(Extended x) { return x; }
+double Down(double x) { return x * (1 / kBig); }
+Extended Down(Extended x) { return {x.high * (1 / kBig), x.low * (1 / kBig)}; }
+double Up(double x) { return x * kBig; }
+Extended Up(Extended x) { return {x.high * kBig, x.low * kBig}; }
+
+// No parameter is left below 0, where the ratio of the terms may rise again.
+bool IsPast(const HyperTerms &t, double k) {
+    return t.a.high + k > 0 && (!t.hasB || t.b.high + k > 0) && t.c.high + k > 0;
+}
+
+template <class Number>
+Scan SumOf(const HyperTerms &terms, int most, double tolerance) {
+    const Number a = Of<Number>(terms.a), b = Of<Number>(terms.b), c = Of<Number>(terms.c);
+    const Number x = Of<Number>(terms.x);
+    const double end = terms.hasB ? std::fabs(terms.x.high) : 0; // of the ratios
+    Number term = Of<Number>({1, 0});
+    Number sum = term;
+    double roundings = 1, peak = 1;
+    int exponent = 0;
+    int below = 0; // what the exponent of the term is lower
+    for (int i = 0; i < most; ++i) {
+        const double k = i;
+        Number top = At(a, k) * x;
+        if (terms.hasB)
+            top = top * At(b, k);
+        const Number quotient = top / (At(c, k) * Of<Number>({k + 1, 0}));
+        term = term * quotient;
+        const double size = std::fabs(Leading(term));
+        const double ratio = std::max(std::fabs(Leading(quotient)), end); // of the terms behind
+        if (size == 0)
+            return {ToPair(sum), roundings, exponent, peak, Leading(top) == 0};
+        if (size < kVanishing) { // may rise again behind the poles
+            if (IsPast(terms, k) && ratio < 1)
+                return {ToPair(sum), roundings, exponent, peak, true};
+            term = Up(term);
+            below += kBigExponent;
+        }
+        if (below > 0) {
+            if (size >= 1) {
+                term = Down(term);
+                below -= kBigExponent;
+            }
+            continue;
+        }
+        sum = sum + term;
+        roundings += size * (2 + 0.2 * k); // more than the root of 4 k
+        peak = std::max(peak, size);
+        if (!(size < kBig)) {
+            if (!(size < kInfinity))
+                break;
+            term = Down(term);
+            sum = Down(sum);
+            roundings /= kBig;
+            peak /= kBig;
+            exponent += kBigExponent;
+        }
+        if (ratio < 1 && size * ratio <= tolerance * std::fabs(Leading(sum)) * (1 - ratio) &&
+            IsPast(terms, k))
+            return {ToPair(sum), roundings, exponent, peak, true};
+    }
+    return {ToPair(sum), roundings, exponent, peak, false};
+}
+
+Estimated None() { return {{{kNaN, 0}, 0}, kInfinity}; }
+
+Estimated Result(const Scan &scan, double error) {
+    return {WideOf(scan.sum, scan.exponent), error};
+}
+
+// The sum in double precision is that of the parameters: no small a + k loses what is behind the double.
+bool IsDouble(const HyperTerms &t) {
+    const auto isDouble = [](Extended a) { return a.low == 0 || a.high > 0; };
+    return isDouble(t.a) && (!t.hasB || isDouble(t.b)) && isDouble(t.c);
+}
+
+bool HasFactor(const HyperForm &form) { return form.power.high != 0; }
+
+Estimated FactorOf(const HyperForm &form) {
+    return form.base.high == 0 ? Estimated{WideExp(form.power), 0} : PowerOf(form.base, form.power);
+}
+
+// The same in double precision, which corrects for what is behind the doubles; an infinite error beyond
+// a moderate range.
+Estimated QuickFactorOf(const HyperForm &form) {
+    const double p = form.power.high;
+    const bool isExp = form.base.high == 0;
+    const double power = isExp ? std::exp(p) : std::pow(form.base.high, p);
+    if (!(power > 1e-250 && power < 1e250))
+        return {{{kNaN, 0}, 0}, kInfinity};
+    const double rest =
+        isExp ? form.power.low
+              : p * (form.base.low / form.base.high) + form.power.low * std::log(form.base.high);
+    return {WideOf({power * (1 + rest), 0}), 2 * kEpsilon};
+}
+
+Estimated Times(const Estimated &a, const Estimated &b) {
+    return {a.value * b.value, a.error + b.error};
+}
+
+// The sum in two doubles, else in integers; `largest` from a scan of the series.
+Estimated Careful(const HyperTerms &terms, double largest, double tolerance) {
+    const Scan pair = SumOf<Extended>(terms, kMostCarefulTerms, 0x1p-106);
+    const double error = pair.error(kPairEpsilon);
+    if (error <= tolerance)
+        return Result(pair, error);
+    const bool isKnown = error < 0.1;
+    const double lost = isKnown ? std::log2(pair.roundings / std::fabs(pair.sum.high)) : 110;
+    Estimated best = isKnown ? Result(pair, error) : None();
+    for (int bits = static_cast<int>(lost - std::log2(tolerance)) + kSpareBits; bits < 2000;
+         bits *= 2) {
+        const Estimated exact = IntegerSum(terms, std::max(largest, pair.largest()), bits);
+        if (exact.error < best.error)
+            best = exact;
+        if (best.error <= tolerance || std::isnan(exact.error))
+            break;
+    }
+    return best;
+}
+
+} // namespace
+
+Estimated SumOfParts(const Estimated &a, const Estimated &b) {
+    const Wide sum = a.value + b.value;
+    const double size = sum.logarithm();
+    const auto share = [&](const Estimated &part) {
+        if (part.value.isZero() || std::isinf(part.error))
+            return part.error;
+        return part.error * std::exp2(part.value.logarithm() - size);
+    };
+    return {sum, share(a) + share(b)};
+}
+
+Estimated Between(const Estimated &low, const Estimated &high, double at) {
+    const Wide first = low.value * WideOf({0.5 * (1 - at), 0});
+    const Wide second = high.value * WideOf({0.5 * (1 + at), 0});
+    return SumOfParts({first, low.error}, {second, high.error});
+}
+
+Estimated CarefulSum(const HyperTerms &terms, double tolerance) {
+    return Careful(terms, 0, tolerance);
+}
+
+Estimated BestForm(const HyperForm *forms, int count) {
+    const HyperForm *best = nullptr;
+    double least = kInfinity, largest = 0;
+    for (const HyperForm *form = forms; form < forms + count; ++form) {
+        const Scan scan = SumOf<double>(form->terms, kMostTerms, 0x1p-60);
+        const double error = scan.error(kEpsilon);
+        if (error <= kGoodDouble && IsDouble(form->terms)) {
+            const Estimated sum = Result(scan, error);
+            if (!HasFactor(*form))
+                return sum;
+            const Estimated factor = QuickFactorOf(*form);
+            return Times(sum, std::isinf(factor.error) ? FactorOf(*form) : factor);
+        }
+        if (!scan.isComplete)
+            continue;
+        const double factor = HasFactor(*form) ? FactorOf(*form).value.logarithm() : 0;
+        const double size = scan.logOfRoundings() + factor;
+        if (size < least) {
+            best = form;
+            least = size;
+            largest = scan.largest();
+        }
+    }
+    if (best == nullptr)
+        return None();
+    const Estimated sum = Careful(best->terms, largest, kGoodPair);
+    return HasFactor(*best) ? Times(sum, FactorOf(*best)) : sum;
+}
+
+} // namespace qx

@@ -1,0 +1,349 @@
+#include "special/tricomi_regions.h"
+
+#include "frame/constants.h"
+#include "special/extended.h"
+#include "special/gamma.h"
+#include "special/kummer_regions.h"
+#include "special/reciprocal_gamma.h"
+
+#include <algorithm>
+#include <cmath>
+
+namespace qx {
+
+namespace {
+
+constexpr double kGood = 40 * kEpsilon;
+constexpr double kGoodRecurrence = 2e-13;
+constexpr double kGoodConnection = 4e-14;
+constexpr double kPlainError = 12 * kEpsilon;
+constexpr double kGoodParts = 1e-27;
+constexpr double kConnectionBelow = 1;
+constexpr double kConnectionFirst = 0.2;
+constexpr double kPlainBelow = 3, kPlainDistance = 0.05;
+constexpr double kPlain = 20; // parameters up to which the functions of doubles serve
+constexpr double kAside = 0x1p-32;
+constexpr int kMostTerms = 20000;
+constexpr int kMostSteps = 3000;
+constexpr double kBig = 0x1p300;
+constexpr int kBigExponent = 300;
+
+Extended Whole(double x) { return {x, 0}; }
+bool Ends(Extended a) { return a.high <= 0 && a.low == 0 && IsInteger(a.high); }
+constexpr Wide kOne = {{0.5, 0}, 1};
+
+template <class Number>
+Number Of(Extended x);
+template <>
+double Of<double>(Extended x) {
+    return x.high;
+}
+template <>
+Extended Of<Extended>(Extended x) {
+    return x;
+}
+double Leading(double x) { return x; }
+double Leading(Extended x) { return x.high; }
+Extended Pair(double x) { return Whole(x); }
+Extended Pair(Extended x) { return x; }
+double Down(double x) { return x * (1 / kBig); }
+Extended Down(Extended x) { return {x.high * (1 / kBig), x.low * (1 / kBig)}; }
+template <class Number>
+constexpr double kPrecision = kEpsilon;
+template <>
+constexpr double kPrecision<Extended> = 0x1p-100;
+
+// Where to begin the recurrence downwards: where the term of the normalising sum has fallen, by F. W. J.
+// Olver's relation of the falling solution to the growing one (Numerical solution of second-order
+// linear difference equations, 1967). 0 where it would be beyond kMostTerms.
+int FirstTerm(double a, double b, double x, bool isWeighted, double tolerance) {
+    constexpr int stride = 8;    // from one term that is looked at to the next
+    double p = 1, step = 1;      // the growing solution
+    double product = 1, sum = 0; // weight times quotient of the coefficients; of the terms
+    for (int n = 1; n < kMostTerms; ++n) {
+        const double at = a + n;
+        const double below = at - b + 1;
+        product *= isWeighted ? (at - 1) * (at - b) / (below * n) : (at - 1) / below;
+        step = ((at - 1) * step + x * p) * (1 / below);
+        p += step;
+        if (n % stride != 0)
+            continue;
+        const double term = product / p;
+        sum += stride * term;
+        if (!std::isfinite(sum))
+            return 0;
+        if (term * n < tolerance * sum)
+            return n + 1;
+        if (!(p < kBig)) {
+            p /= kBig;
+            step /= kBig;
+            product /= kBig;
+        }
+        if (!(sum < kBig)) {
+            product /= kBig;
+            sum /= kBig;
+        }
+    }
+    return 0;
+}
+
+// U(a, b, x) and U(a + 1, b, x) in units of 2^exponent, and the steps that led there.
+template <class Number>
+struct Neighbours {
+    Number at, above;
+    Wide unit;
+    int steps;
+    bool isKnown;
+};
+
+// a >= 1, a - b >= 0. With f_n = (first)_n U(first + n, b, x), where first is a less a whole number,
+// and d_n = f_n - f_(n+1), all above 0: d_(n-1) = ((first + n - b + 1) d_n + x f_n) / (first + n - 1).
+template <class Number>
+Neighbours<Number> FromAbove(Extended a, Extended b, double x) {
+    const double kept = std::floor(std::min(a.high - 1, a.high - b.high));
+    const Neighbours<Number> none = {{}, {}, kOne, 0, false};
+    if (!(kept < kMostTerms))
+        return none;
+    const Extended first = a - Whole(kept);
+    const double tolerance = 0.1 * kPrecision<Number>;
+    const int byWeight = FirstTerm(first.high, b.high, x, true, tolerance);
+    const int bySize = FirstTerm(a.high, b.high, x, false, tolerance);
+    if (byWeight == 0 || bySize == 0)
+        return none;
+    const int last = std::max(byWeight, bySize + static_cast<int>(kept));
+    const Number start = Of<Number>(first), excess = Of<Number>(first - b),
+                 point = Of<Number>(Whole(x));
+    Number f = Of<Number>(Whole(1)), d = f, sum = f, above = Of<Number>(Whole(0)), at = above,
+           next = above;
+    Number product = f; // (first)_kept
+    int downs = 0;      // of at and next more than of the sum
+    for (int n = last; n > 0; --n) {
+        const Number whole = Of<Number>(Whole(n));
+        sum = sum * ((excess + whole) / whole);
+        d = ((excess + Of<Number>(Whole(n + 1.0))) * d + point * f) /
+            (start + Of<Number>(Whole(n - 1.0)));
+        above = f;
+        f = f + d;
+        sum = sum + f;
+        if (n == kept + 1) {
+            at = f;
+            next = above;
+            downs = 0;
+        }
+        if (!(Leading(sum) < kBig)) {
+            f = Down(f);
+            d = Down(d);
+            sum = Down(sum);
+            ++downs;
+        }
+        if (n <= kept) {
+            product = product * (start + Of<Number>(Whole(n - 1.0)));
+            if (!(Leading(product) < kBig)) {
+                product = Down(product);
+                ++downs;
+            }
+        }
+    }
+    Wide unit = PowerOf(Whole(x), -first).value;
+    unit.exponent -= kBigExponent * downs;
+    const Number whole = product * sum;
+    return {at / whole, next / (Of<Number>(a) * whole), unit, last, true};
+}
+
+template <class Number>
+void KeepInRange(Number &u, Number &v, Wide &unit) {
+    if (std::fabs(Leading(u)) < kBig && std::fabs(Leading(v)) < kBig)
+        return;
+    u = Down(u);
+    v = Down(v);
+    unit.exponent += kBigExponent;
+}
+
+// The same for any a, b <= x + 1.
+template <class Number>
+Neighbours<Number> DownInA(Extended a, Extended b, double x) {
+    const double up =
+        std::max(0.0, std::max(std::ceil(1 - a.high), std::ceil(b.high - a.high)) + 1);
+    if (up > kMostSteps)
+        return {{}, {}, kOne, 0, false};
+    Neighbours<Number> u = FromAbove<Number>(a + Whole(up), b, x);
+    for (double n = up; n > 0; --n) {
+        const Extended top = a + Whole(n);
+        const Number from = Of<Number>(top);
+        const Number middle = Of<Number>(Whole(2) * top + Whole(x) - b);
+        const Number below = middle * u.at - from * Of<Number>(top - b + Whole(1)) * u.above;
+        u.above = u.at;
+        u.at = below;
+        KeepInRange(u.at, u.above, u.unit);
+    }
+    u.steps += static_cast<int>(up);
+    return u;
+}
+
+// From b <= x + 1 upwards: e = U(b) - U(b - 1) = -U'(b - 1), x e(b + 1) = (b - 1 - a) e + a U(b).
+template <class Number>
+Estimated ByRecurrences(Extended a, Extended b, double x) {
+    const double up = std::max(0.0, std::ceil(b.high - 1 - x));
+    const Estimated none = {kOne, kInfinity};
+    if (up > kMostSteps)
+        return none;
+    Extended second = b - Whole(up);
+    Neighbours<Number> u = DownInA<Number>(a, second, x);
+    if (!u.isKnown)
+        return none;
+    const Number first = Of<Number>(a), point = Of<Number>(Whole(x));
+    double scale = std::sqrt(std::fabs(a.high * (a.high - second.high + 1)));
+    if (up > 0) {
+        const Number e = first * (u.at - Of<Number>(a - second + Whole(1)) * u.above) / point;
+        u.above = e;
+        u.at = u.at + e;
+        scale = std::sqrt(x / (std::fabs(a.high) + x));
+    }
+    for (double n = 1; n < up; ++n) {
+        const Extended now = second + Whole(n - 1);
+        const Extended fall = now - a; // of b - 1 - a
+        if (fall.high > 0) {
+            u.above = (Of<Number>(fall) * u.above + first * u.at) / point;
+            u.at = u.at + u.above;
+        } else {
+            const Number next =
+                u.at + (Of<Number>(now) * u.at - Of<Number>(fall) * (u.at - u.above)) / point;
+            u.above = next - u.at;
+            u.at = next;
+        }
+        KeepInRange(u.at, u.above, u.unit);
+    }
+    const double size = std::fabs(Leading(u.at));
+    const double amplitude = size + scale * std::fabs(Leading(u.above));
+    double weight = 8 + std::sqrt(static_cast<double>(u.steps)) + up;
+    if (up > 0 && a.high < 0) // the part that grows has a factor 1 / gamma(a)
+        weight += 0.1 * weight / std::fabs((a - Whole(std::rint(a.high))).high);
+    return {u.unit * WideOf(Pair(u.at)), 4 * weight * kPrecision<Number> * amplitude / size};
+}
+
+// a = -n, b >= 1: (-1)^n (b)_n M(-n, b, x).
+Estimated Polynomial(Extended a, Extended b, double x) {
+    const Estimated factor = GammaQuotientOf({b - a, Whole(1)}, {b, Whole(1)});
+    const HyperForm form = {{a, Whole(1), b, Whole(x), false}, Whole(0), Whole(0)};
+    const Estimated value = BestForm(&form, 1);
+    const Wide sign = {Whole(IsOdd(a.high) ? -0.5 : 0.5), 1};
+    return {value.value * factor.value * sign, value.error + factor.error};
+}
+
+// Where b is not an integer: gamma(1 - b) / gamma(a - b + 1) M(a, b, x) +
+// gamma(b - 1) / gamma(a) x^(1-b) M(a - b + 1, 2 - b, x).
+Estimated Connection(Extended a, Extended b, double x) {
+    const Extended one = Whole(1);
+    const Extended d = a - b + one;
+    const Estimated firstFactor = GammaQuotientOf({one - b, one}, {d, one});
+    const Estimated secondFactor = GammaQuotientOf({b - one, one}, {a, one});
+    if (std::isinf(firstFactor.error + secondFactor.error))
+        return {kOne, kInfinity};
+    const Estimated m = CarefulSum({a, one, b, Whole(x), false}, kGoodParts);
+    const Estimated n = CarefulSum({d, one, Whole(2) - b, Whole(x), false}, kGoodParts);
+    const Wide first = firstFactor.value * m.value;
+    const Estimated power = PowerOf(Whole(x), one - b);
+    const Wide second = secondFactor.value * power.value * n.value;
+    return SumOfParts({first, m.error + firstFactor.error},
+                      {second, n.error + secondFactor.error + power.error});
+}
+
+// The same in double precision for moderate parameters, b away from integers.
+Estimated PlainConnection(double a, double b, double x) {
+    const double d = a - b + 1;
+    if (!(std::fabs(a) <= kPlain && std::fabs(b) <= kPlain && std::fabs(d) <= kPlain))
+        return {kOne, kInfinity};
+    const HyperForm forms[] = {
+        {{Whole(a), Whole(1), Whole(b), Whole(x), false}, {0, 0}, {0, 0}},
+        {{Whole(d), Whole(1), Whole(2 - b), Whole(x), false}, {0, 0}, {0, 0}}};
+    const Estimated m = BestForm(forms, 1);
+    const Estimated n = BestForm(forms + 1, 1);
+    const double first = GammaFunction(1 - b) * ReciprocalGamma(d);
+    const double second = GammaFunction(b - 1) * ReciprocalGamma(a) * std::pow(x, 1 - b);
+    const double error = (kPlainError + kEpsilon * std::fabs(b)) / std::fabs(b - std::rint(b));
+    return SumOfParts({WideOf(Whole(first)) * m.value, m.error + error},
+                      {WideOf(Whole(second)) * n.value, n.error + error});
+}
+
+Estimated BesideIntegers(Extended a, Extended b, double x) {
+    const double whole = std::rint(b.high);
+    const Extended off = b - Whole(whole);
+    if (std::fabs(off.high) >= kAside)
+        return Connection(a, b, x);
+    const Estimated low = Connection(a, Whole(whole) - Whole(kAside), x);
+    const Estimated high = Connection(a, Whole(whole) + Whole(kAside), x);
+    return Between(low, high, off.high / kAside);
+}
+
+double AtZero(double a, double b) {
+    if (a == 0)
+        return 1;
+    const Extended d = ExactSum(1, -b) + Whole(a);
+    const bool ends = a < 0 && IsInteger(a);
+    if (b < 1) { // gamma(1 - b) / gamma(a - b + 1)
+        const Estimated limit = GammaQuotientOf({ExactSum(1, -b), Whole(1)}, {d, Whole(1)});
+        return std::isfinite(limit.error) ? limit.value.rounded() : kNaN;
+    }
+    if (ends) { // (-1)^n (b)_n
+        const Estimated product =
+            GammaQuotientOf({ExactSum(b, -a), Whole(1)}, {Whole(b), Whole(1)});
+        return std::isfinite(product.error)
+                   ? (IsOdd(a) ? -product.value.rounded() : product.value.rounded())
+                   : kNaN;
+    }
+    const WideGamma gamma = GammaOf(Whole(a));
+    return gamma.isPole || std::isinf(gamma.gamma.error)
+               ? kNaN
+               : std::copysign(kInfinity, gamma.gamma.value.value.high);
+}
+
+// For small x.
+Estimated Connected(Extended a, Extended b, double x) {
+    const Estimated plain = PlainConnection(a.high, b.high, x);
+    return plain.error <= kGoodConnection ? plain : BesideIntegers(a, b, x);
+}
+
+// b >= 1.
+Estimated FromLargeB(Extended a, Extended b, double x) {
+    if (Ends(a))
+        return Polynomial(a, b, x);
+    const Estimated value = ByRecurrences<double>(a, b, x);
+    return value.error <= kGoodRecurrence ? value : ByRecurrences<Extended>(a, b, x);
+}
+
+Estimated ByRegion(Extended a, Extended b, double x) {
+    const bool isTurned = b.high < 1;
+    const Extended first = isTurned ? a - b + Whole(1) : a;
+    Estimated connected = {kOne, kInfinity};
+    if (x < kConnectionFirst && !Ends(first))
+        connected = Connected(a, b, x);
+    else if (x < kPlainBelow && std::fabs(b.high - std::rint(b.high)) > kPlainDistance)
+        connected = PlainConnection(a.high, b.high, x);
+    if (connected.error <= kGoodConnection)
+        return connected;
+    Estimated value = FromLargeB(first, isTurned ? Whole(2) - b : b, x);
+    if (isTurned)
+        value.value = value.value * PowerOf(Whole(x), Whole(1) - b).value;
+    if (x >= kConnectionFirst && x < kConnectionBelow && !(value.error <= kHyperAccepted))
+        connected = Connected(a, b, x);
+    return connected.error < value.error ? connected : value;
+}
+
+} // namespace
+
+double TricomiByRegion(double x, double a, double b) {
+    if (!std::isfinite(x) || !std::isfinite(a) || !std::isfinite(b) || x < 0)
+        return kNaN;
+    if (a == 0)
+        return 1;
+    if (x == 0)
+        return AtZero(a, b);
+    const Extended d = ExactSum(1, -b) + Whole(a);
+    const AsymptoticResult sum = AsymptoticSum(a, d.high, -1 / x);
+    if (sum.error <= kGood)
+        return (PowerOf(Whole(x), Whole(-a)).value * WideOf(Whole(sum.sum))).rounded();
+    const Estimated value = ByRegion(Whole(a), Whole(b), x);
+    return value.error <= kHyperAccepted ? value.value.rounded() : kNaN;
+}
+
+} // namespace qx
