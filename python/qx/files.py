@@ -6,7 +6,6 @@ import lzma
 import os
 import re
 import shutil
-import sys
 import tempfile
 import zipfile
 import zlib
@@ -41,8 +40,20 @@ BINARY = {"an ORC table", "an MP4 video or sound", "an ABF recording", "an Arrow
           "an MDF recording"}
 
 
+CONTROL = re.compile("[\x00-\x1f\x7f-\x9f\u061c\u200e\u200f\u2028-\u202e\u2066-\u2069\ud800-\udfff]")
+
+
+def printable(text):
+    """A text of a file, or the name of one, without what a terminal takes for a command and without marks that
+    turn its direction."""
+    return CONTROL.sub(lambda found: " " if found[0] in "\t\n\r" else "\N{REPLACEMENT CHARACTER}", text)
+
+
 class InputError(Exception):
-    """What is wrong with an input, with file and line."""
+    """What is wrong with an input, with file and line; one line that a terminal may show."""
+
+    def __init__(self, text=""):
+        super().__init__(printable(text))
 
 
 def needs(what, package):
@@ -51,17 +62,12 @@ def needs(what, package):
 
 
 class Source:
-    """The contents of a file, or of standard input for "-". A context manager: copies end with it."""
+    """The contents of a file, which messages call `path`. A context manager: copies end with it."""
 
-    def __init__(self, path):
-        self.path = os.fspath(path)
+    def __init__(self, path, file):
+        self.path, self._file = path, file
         self.name = os.path.basename(self.path)
         self._folder, self._unpack, self._local = None, None, None
-        if self.path == PIPE:
-            self.path = self.name = "standard input"
-            self._file = self._copy(sys.stdin.buffer)
-        else:
-            self._file = self.path
         if not os.path.exists(self._file):
             raise InputError(f"{self.path}: no such file")
         if os.path.isdir(self._file):

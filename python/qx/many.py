@@ -207,7 +207,7 @@ def write(paths, folder, options, workers=None, scheduler=None, tell=lambda outc
     _check(pairs, folder, force)
     if start:
         start(len(pairs))
-    os.makedirs(folder, exist_ok=True)
+    outputs.make_folder(folder)
     found = []
     for outcome in outcomes(pairs, options, workers, scheduler):
         if not outcome.failure:

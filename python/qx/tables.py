@@ -14,7 +14,7 @@ import re
 
 import numpy as np
 
-from .files import InputError, Source
+from .files import InputError
 from .rates import seconds_of
 from .times import CLOCK, ONLY_DIGITS, SLASHED, TIME_OF_DAY, TWO_FIELDS, Format
 
@@ -324,7 +324,6 @@ class Reader:
     where = "a comment of the file"
 
     def __init__(self, source, decimal=None, missing=None, dates=None, thousands=False):
-        source = source if hasattr(source, "open") else Source(source)
         self.source, self.path, self.name = source, source.path, source.name
         self.missing, self.dates = missing, dates
         self.named_as_time = None  # the number of a column that is time whatever its name is
