@@ -1,21 +1,21 @@
 """What a file is, by its first bytes, and its contents: compressed, from a pipe, or as they are."""
 
 import bz2
+import contextlib
 import gzip
+import io
 import lzma
 import os
 import re
 import shutil
 import tempfile
 import zipfile
-import zlib
 
 HEAD = 1 << 16
 PIPE = "-"
 UNPACKING = {b"\x1f\x8b": gzip.open, b"BZh": bz2.open, b"\xfd7zXZ\0": lzma.open}
 ZSTD = b"\x28\xb5\x2f\xfd"
 COMPRESSED = (".gz", ".bz2", ".xz", ".zst", ".zip")
-BROKEN = (EOFError, zlib.error, lzma.LZMAError, zipfile.BadZipFile, gzip.BadGzipFile)
 
 # What begins so is read by stored.py ...
 ARRAYS = ((b"\x93NUMPY", "npy"), (b"\x89HDF\r\n\x1a\n", "hdf5"), (b"PAR1", "parquet"),
@@ -61,6 +61,40 @@ def needs(what, package):
     return InputError(f"{what}: reading needs {package}")
 
 
+@contextlib.contextmanager
+def unpacking(path):
+    """What an unpacker raises is an InputError: of a broken file that may be an exception of any kind."""
+    try:
+        yield
+    except (InputError, MemoryError):
+        raise
+    except Exception as error:
+        raise InputError(f"{path}: cannot be unpacked, perhaps cut off: {error or type(error).__name__}") from None
+
+
+class _Unpacked(io.RawIOBase):
+    """A stream that unpacks as it is read."""
+
+    def __init__(self, path, unpack):
+        self._path = path
+        with unpacking(path):
+            self._stream = unpack()
+
+    def readable(self):
+        return True
+
+    def readinto(self, room):
+        with unpacking(self._path):
+            found = self._stream.read(len(room))
+        room[:len(found)] = found
+        return len(found)
+
+    def close(self):
+        if not self.closed:
+            self._stream.close()
+        super().close()
+
+
 class Source:
     """The contents of a file, which messages call `path`. A context manager: copies end with it."""
 
@@ -88,8 +122,11 @@ class Source:
         if not self._folder:
             self._folder = tempfile.TemporaryDirectory(prefix="qx-")
         handle, path = tempfile.mkstemp(dir=self._folder.name)
-        with open(handle, "wb") as file:
-            shutil.copyfileobj(stream, file, 1 << 20)
+        try:
+            with open(handle, "wb") as file:
+                shutil.copyfileobj(stream, file, 1 << 20)
+        except OSError as error:
+            raise InputError(f"{self.path}: cannot be unpacked into {tempfile.gettempdir()}: {error.strerror}") from None
         return path
 
     def _look_inside(self):
@@ -100,7 +137,7 @@ class Source:
         if self.head.startswith(ZSTD):
             self._unpack = self._zstd
         if self.head.startswith(b"PK\x03\x04"):
-            with zipfile.ZipFile(self._file) as archive:
+            with unpacking(self.path), zipfile.ZipFile(self._file) as archive:
                 self.members = [name for name in archive.namelist()
                                 if not name.endswith("/") and not name.startswith("__MACOSX/")]
             if len(self.members) == 1 and not self.members[0].endswith(".npy"):
@@ -118,7 +155,7 @@ class Source:
 
     def open(self):
         """The contents as a stream of bytes from the start."""
-        return self._unpack() if self._unpack else open(self._file, "rb")
+        return io.BufferedReader(_Unpacked(self.path, self._unpack), 1 << 18) if self._unpack else open(self._file, "rb")
 
     def local(self):
         """The path of a file that holds the contents as they are."""
@@ -155,7 +192,7 @@ class Source:
         if "xl/workbook.xml" in names:
             return "xlsx"
         if "mimetype" in names and "content.xml" in names:
-            with zipfile.ZipFile(self._file) as archive:
+            with unpacking(self.path), zipfile.ZipFile(self._file) as archive:
                 if b"spreadsheet" in archive.read("mimetype"):
                     return "ods"
         if "[Content_Types].xml" in names or "mimetype" in names:

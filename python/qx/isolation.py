@@ -273,7 +273,7 @@ def serve(descriptor, watched):
 def _send(channel, answer):
     import resource
     most = resource.getrusage(resource.RUSAGE_SELF).ru_maxrss << 10
-    reusable = most < KEPT and not isinstance(answer[1], MemoryError)
+    reusable = most < KEPT
     try:
         channel.send((*answer, reusable))
     except MemoryError as error:

@@ -7,6 +7,7 @@ file with the mark may be made anew, so that a command can be repeated.
 
 import contextlib
 import os
+import re
 import stat
 
 MARK = "python3 -m qx"
@@ -18,6 +19,7 @@ class Exists(ValueError):
 
 
 _unfinished = set()
+UNFINISHED = re.compile(r"\.\d+\.part\.")  # how names begin of what a process that was killed has left behind
 
 
 def mark(command):

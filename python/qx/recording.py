@@ -6,6 +6,7 @@ docs/recordings.md has the rules.
 """
 
 import contextlib
+import csv
 import dataclasses
 import os
 import re
@@ -107,8 +108,8 @@ def opened(path, file):
     try:
         with files.Source(path, file) as source:
             yield source
-    except files.BROKEN as error:
-        raise InputError(f"{path}: cannot be unpacked, perhaps cut off: {error}") from None
+    except csv.Error as error:
+        raise InputError(f"{path}: cannot be cut into cells: {error}") from None
     except OSError as error:
         raise InputError(f"{path}: cannot be read: {error.strerror or error}") from None
 
