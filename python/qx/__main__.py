@@ -2,6 +2,7 @@
 
 import argparse
 import contextlib
+import errno
 import io
 import os
 import sys
@@ -11,6 +12,7 @@ from .files import printable
 from .interruption import EXIT, Watch
 
 EXIT_WRONG = 2
+FULL = (errno.ENOSPC, errno.EDQUOT, errno.EFBIG, errno.EIO)
 EXAMPLES = """\
 examples:
   python3 -m qx report examples/data/ecg_208_360hz.csv
@@ -59,13 +61,15 @@ def _flush():
         raise
     except OSError as error:
         os.dup2(os.open(os.devnull, os.O_WRONLY), sys.stdout.fileno())
-        raise OSError(f"standard output: cannot be written: {error.strerror}") from None
+        raise OSError(error.errno, error.strerror) from None
 
 
 def _line_of(error):
     """What went wrong, in one line."""
     if isinstance(error, OSError) and error.strerror:
-        text = f"{error.filename}: {error.strerror}" if error.filename else error.strerror
+        # What has no name here is standard output: outputs.py names its files.
+        place = error.filename or ("standard output: cannot be written" if error.errno in FULL else "")
+        text = f"{place}: {error.strerror}" if place else error.strerror
     else:
         text = str(error.args[0]) if isinstance(error, LookupError) and error.args else str(error)
     return printable(text) or type(error).__name__

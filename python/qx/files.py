@@ -102,6 +102,7 @@ class Source:
         self.path, self._file = path, file
         self.name = os.path.basename(self.path)
         self._folder, self._unpack, self._local = None, None, None
+        self._open = contextlib.ExitStack()
         if not os.path.exists(self._file):
             raise InputError(f"{self.path}: no such file")
         if os.path.isdir(self._file):
@@ -114,6 +115,7 @@ class Source:
         return self
 
     def __exit__(self, *_):
+        self._open.close()
         if self._folder:
             self._folder.cleanup()
 
@@ -165,6 +167,10 @@ class Source:
             with self.open() as stream:
                 self._local = self._copy(stream)
         return self._local
+
+    def keep(self, file):
+        """An open file, which is closed when the contents are left."""
+        return self._open.enter_context(file)
 
     def kind(self):
         """The kind that stored.py reads, or an empty text; what nobody reads is refused by its name."""

@@ -13,6 +13,7 @@ The limits keep faults and floods away and are no sandbox: a worker has the righ
 import atexit
 import contextlib
 import os
+import pickle
 import shutil
 import signal
 import socket
@@ -265,7 +266,7 @@ def serve(descriptor, watched):
             except Exception as error:
                 if os.environ.get("QX_TRACEBACK"):
                     traceback.print_exc()
-                answer = "failed", error
+                answer = "failed", _sendable(error, arguments[0])
             _send(channel, answer)
             del answer, function, arguments, options
 
@@ -278,10 +279,14 @@ def _send(channel, answer):
         channel.send((*answer, reusable))
     except MemoryError as error:
         channel.send(("failed", error, False))
-    except (TypeError, AttributeError, ValueError) as error:  # an exception that cannot be pickled
-        if answer[0] == "done":
-            raise
-        channel.send(("failed", InputError(f"{type(answer[1]).__name__}: {answer[1]} ({error})"), reusable))
+
+
+def _sendable(error, path):
+    """The exception, or a plain one where the other process could not make it anew."""
+    try:
+        return pickle.loads(pickle.dumps(error))
+    except Exception:
+        return InputError(f"{path}: {type(error).__name__}: {error}")
 
 
 def _limit(limits):

@@ -167,6 +167,7 @@ def _finished(executor, pairs, options, left):
 def index(found, left=()):
     """The page that leads to the others."""
     from . import pages
+
     def escape(text, quote=True):
         return html.escape(printable(text), quote)
 

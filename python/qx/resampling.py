@@ -4,6 +4,7 @@ import contextlib
 import dataclasses
 import math
 import os
+from typing import Any
 
 import numpy as np
 import soundfile
@@ -109,7 +110,9 @@ class _Resampled:
 
     def __init__(self, target, rate, begun, progress, stack):
         self._target, self._rate, self._begun, self._progress = target, rate, begun, progress
-        self._stack, self._out, self.resampler = stack, None, None
+        self._stack = stack
+        self._out: Any = None
+        self.resampler: Any = None
 
     def take(self, told):
         """The Sound, then its blocks."""

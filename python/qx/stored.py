@@ -205,12 +205,12 @@ def read_hdf5(source, wanted):
     except ImportError:
         raise needs(f"{source.path}: an HDF5 file", "the package python3-h5py") from None
     with reading(source.path, "HDF5"):
-        arrays, notes = _contents_of_hdf5(h5py, source.local())
+        arrays, notes = _contents_of_hdf5(h5py, source)
     return assembled(source, arrays, notes, wanted)
 
 
-def _contents_of_hdf5(h5py, path):
-    file = h5py.File(path, "r")  # stays open: its arrays are read in parts
+def _contents_of_hdf5(h5py, source):
+    file = source.keep(h5py.File(source.local(), "r"))  # its arrays are read in parts
     arrays, notes = [], [*_attributes(file)]
 
     def visit(name, item):

@@ -18,7 +18,6 @@ import io
 import lzma
 import random
 import re
-import struct
 import sys
 import tempfile
 import time
@@ -34,14 +33,16 @@ if str(PYTHON) not in sys.path:
 from qx import isolation, recording  # noqa: E402
 
 RAMP = np.arange(60.0) % 7
-TEXT = ("# fs = 100 Hz\ntime [s];force (N);remark\n" + "".join(f"{i / 100};{v};7\n" for i, v in enumerate(RAMP))).encode()
+TEXT = ("# fs = 100 Hz\ntime [s];force (N);remark\n"
+        + "".join(f"{i / 100};{v};7\n" for i, v in enumerate(RAMP))).encode()
 DATED = ("Date,Time,u [V]\n" + "".join(f"01/02/2024,11:59:{i:02},{v}\n" for i, v in enumerate(RAMP))).encode()
 NUMBERS = (0, 1, 2, 0x7f, 0x80, 0xff, 0x7fff, 0x8000, 0xffff, 0x7fffffff, 0x80000000, 0xfffffffe, 0xffffffff, 2**40,
            2**63 - 1, 2**63, 2**64 - 1)
-TOKENS = (b"nan", b"-inf", b"1e999", b"1e308", b"-1e308", b"9" * 400, b"\"", b"'", b";", b",", b"\t", b"|", b"\n", b"\r\n",
-          b"#", b"%", b"<b>", b"]]>", b"&x;", b"\xef\xbb\xbf", b"\xff\xfe", b"\x00", "\u00a0\u2212\u0663".encode(), b"31.02.2024",
-          b"2024-13-45", b"99:99:99", b"24:00", b"fs = 0 Hz", b"fs = 1e400 kHz", b"sampling rate", b"dt = -1 s", b"{", b"[" * 60,
-          b"20240230", b"1,234,567", b"1.234,5", b"0x1p3", b"1_000", b"1e", b"-", b"")
+TOKENS = (b"nan", b"-inf", b"1e999", b"1e308", b"-1e308", b"9" * 400, b"\"", b"'", b";", b",", b"\t", b"|", b"\n",
+          b"\r\n", b"#", b"%", b"<b>", b"]]>", b"&x;", b"\xef\xbb\xbf", b"\xff\xfe", b"\x00",
+          "\u00a0\u2212\u0663".encode(), b"31.02.2024", b"00/01/2024", b"01/01/9999", b"2024-13-45", b"99:99:99", b"24:00",
+          b"fs = 0 Hz", b"fs = 1e400 kHz", b"sampling rate", b"dt = -1 s", b"{", b"[" * 60, b"20240230", b"1,234,567",
+          b"1.234,5", b"0x1p3", b"1_000", b"1e", b"-", b"")
 
 
 def made(write):
@@ -216,8 +217,8 @@ class Tally:
         except recording.InputError as error:
             self.counts["refused"] += 1
             text = str(error)
-            if end := re.search(r"crashed \(\w+\)|takes more than .* of (?:processor time|memory)|has done nothing|was ended",
-                                text):
+            if end := re.search(r"crashed \(\w+\)|takes more than .* of (?:processor time|memory)|has done nothing|"
+                                r"was ended", text):
                 self.ends[re.sub(r"\d+", "n", end[0])] += 1
             if not text.startswith(str(path)) or "\n" in text:
                 self.faults.append(f"no line of ours: {text!r}")
