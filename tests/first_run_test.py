@@ -407,7 +407,8 @@ class Machine(Case):
     def test_a_build_that_was_killed_is_made_anew(self):
         self.take_from_cache("sources")
         started = self.folder / "started"
-        self.program("ar", f'[ -f "{started}" ] && exec /usr/bin/ar "$@"; head -c 1000 /bin/ls >"$2"; touch "{started}"; sleep 60')
+        self.program("ar", f'[ -f "{started}" ] && exec /usr/bin/ar "$@"\n'
+                     f'head -c 1000 /bin/ls >"$2"; touch "{started}"; sleep 60')
         process = subprocess.Popen([SOURCE / "tools/setup/libm", "linux"], env=self.environment, start_new_session=True,
                                    stdout=subprocess.PIPE, stderr=subprocess.STDOUT)
         limit = time.monotonic() + 60

@@ -26,6 +26,8 @@ def report_on(options):
     reading = reading_options.of(options)
     if many.is_many(options.files):
         return report_on_many(options, reading)
+    from .. import isolation
+    isolation.prepare()  # while this process loads what comes after reading
     import tqdm
 
     from .. import outputs, recording, report
