@@ -375,6 +375,81 @@ class Pinned(Case):
         self.assertEqual([path for path in self.cache.rglob("*") if path.is_file()], [])
 
 
+class Machine(Case):
+    """Faults of the machine: one clear line, and nothing half-made is taken for whole."""
+
+    def fake_build(self):
+        """A copy whose build is a program that notes when it begins and ends."""
+        self.take_from_cache("libm", "lapack")
+        log = self.folder / "log"
+        self.program("cmake", f'echo begin >>"{log}"; sleep 0.3; echo end >>"{log}"')
+        return self.fresh_copy() / "run", log
+
+    def test_no_room_in_the_cache(self):
+        self.take_from_cache("sources")
+        script = (f"mount -t tmpfs -o size=2m tmpfs '{self.cache}' && ln -s '{SOURCES}' '{self.cache}/sources' || exit 77;"
+                  f"'{SOURCE}/tools/setup/libm' linux; [ $? = 1 ] && ! '{SOURCE}/tools/setup/libm' linux find")
+        ran = self.run_script("unshare", *["-m"] if os.geteuid() == 0 else ["-rm"], "bash", "-c", script)
+        if ran.returncode == 77 or "unshare failed" in ran.stderr:
+            self.skipTest(f"NOT TESTED: no disk can be mounted here: {ran.stderr}")
+        self.assertEqual((ran.returncode, ran.stdout), (0, ""), ran.stderr)
+        self.assertIn("No space left on device", ran.stderr)
+        self.assertRegex(self.last_line(ran), r"^\[libm\] (the source of musl cannot be unpacked|building .* failed)")
+
+    def test_no_cache_can_be_made(self):
+        for name, reason in (("/proc/nobody", "No such file or directory"), (str(self.folder / "file"), "Not a directory")):
+            (self.folder / "file").touch()
+            self.environment["QX_CACHE"] = f"{name}/cache"
+            ran = self.run_script(SOURCE / "tools/setup/libm", "linux")
+            self.assertEqual((ran.returncode, ran.stderr.count("\n")), (1, 1), ran.stderr)
+            self.assertRegex(ran.stderr, rf"there is no cache \(.*{name}.*{reason}\): QX_CACHE names another folder")
+
+    def test_a_build_that_was_killed_is_made_anew(self):
+        self.take_from_cache("sources")
+        started = self.folder / "started"
+        self.program("ar", f'[ -f "{started}" ] && exec /usr/bin/ar "$@"\n'
+                     f'head -c 1000 /bin/ls >"$2"; touch "{started}"; sleep 60')
+        process = subprocess.Popen([SOURCE / "tools/setup/libm", "linux"], env=self.environment, start_new_session=True,
+                                   stdout=subprocess.PIPE, stderr=subprocess.STDOUT)
+        limit = time.monotonic() + 60
+        while not started.exists() and time.monotonic() < limit:
+            time.sleep(0.02)
+        process.kill()
+        for line in processes_with(f"QX_CACHE={self.cache}"):
+            with contextlib.suppress(ProcessLookupError):
+                os.kill(int(line.split(":")[0]), signal.SIGKILL)
+        process.communicate()
+        self.assertNotEqual([*self.cache.rglob("*.a")], [], "it was killed with a part of the archive written")
+        command = [SOURCE / "tools/setup/libm", "linux"]
+        self.assertEqual(self.run_script(*command, "find").returncode, 1)
+        ran = self.run_script(*command)
+        self.assertEqual(ran.returncode, 0, ran.stderr)
+        built = subprocess.run([*command, "find"], capture_output=True, text=True).stdout.strip()
+        self.assertEqual(Path(ran.stdout.strip()).read_bytes(), Path(built).read_bytes(), "the machine's own")
+
+    def test_two_first_runs_build_one_after_the_other(self):
+        run, log = self.fake_build()
+        both = [subprocess.Popen([run], env=self.environment, stdout=subprocess.PIPE, stderr=subprocess.PIPE, text=True)
+                for _ in range(2)]
+        told = "".join(process.communicate()[1] for process in both)
+        self.assertRegex(told, r"\[run\] waiting for another script, which has .*/build/release.lock")
+        self.assertEqual(log.read_text(), 4 * "begin\nend\n", told)
+
+    def test_files_from_the_future_are_told(self):
+        run, log = self.fake_build()
+        ahead = time.time() + 7200
+        (run.parent / "build/release").mkdir(parents=True)
+        for name in ("src/frame/views.h", "build/release/old.o"):
+            path = run.parent / name
+            path.touch()
+            os.utime(path, (ahead, ahead))
+            ran = self.run_script(run)
+            self.assertEqual((ran.returncode, ran.stderr.count("\n")), (1, 1), ran.stderr)
+            self.assertRegex(ran.stderr, rf"{name} is from the future: if the clock is right now, touch the file")
+            os.utime(path)
+        self.assertFalse(log.exists())
+
+
 class OnATerminal(Case):
     def test_progress_and_the_end_of_a_command_are_told(self):
         slow = "bash -c 'echo [1/3]; sleep 1.2; echo [2/3]; exit 3'"

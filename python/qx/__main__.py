@@ -1,14 +1,18 @@
 """The command line: python3 -m qx COMMAND; the commands stand in qx/commands."""
 
 import argparse
+import contextlib
+import errno
 import io
 import os
 import sys
 
 from .commands import add_all
+from .files import printable
 from .interruption import EXIT, Watch
 
 EXIT_WRONG = 2
+FULL = (errno.ENOSPC, errno.EDQUOT, errno.EFBIG, errno.EIO)
 EXAMPLES = """\
 examples:
   python3 -m qx report examples/data/ecg_208_360hz.csv
@@ -36,16 +40,39 @@ def main(argv=None):
             stream.reconfigure(errors="replace")
     try:
         options.run(options)
-        sys.stdout.flush()
+        _flush()
     except BrokenPipeError:
         os.dup2(os.open(os.devnull, os.O_WRONLY), sys.stdout.fileno())
     except Exception as error:  # every failure is one line for the user
         if os.environ.get("QX_TRACEBACK"):
             raise
-        message = str(error.args[0]) if isinstance(error, LookupError) and error.args else str(error)
-        print(f"qx: {message or type(error).__name__}", file=sys.stderr)
+        with contextlib.suppress(OSError):
+            _flush()
+        print(f"qx: {_line_of(error)}", file=sys.stderr)
         return EXIT_WRONG
     return 0
+
+
+def _flush():
+    """Writes what is left for standard output; where that fails the rest is dropped, and not tried again at exit."""
+    try:
+        sys.stdout.flush()
+    except BrokenPipeError:
+        raise
+    except OSError as error:
+        os.dup2(os.open(os.devnull, os.O_WRONLY), sys.stdout.fileno())
+        raise OSError(error.errno, error.strerror) from None
+
+
+def _line_of(error):
+    """What went wrong, in one line."""
+    if isinstance(error, OSError) and error.strerror:
+        # What has no name here is standard output: outputs.py names its files.
+        place = error.filename or ("standard output: cannot be written" if error.errno in FULL else "")
+        text = f"{place}: {error.strerror}" if place else error.strerror
+    else:
+        text = str(error.args[0]) if isinstance(error, LookupError) and error.args else str(error)
+    return printable(text) or type(error).__name__
 
 
 def run():

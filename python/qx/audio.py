@@ -1,7 +1,10 @@
 """Audio files by libsndfile: every format and coding that it reads."""
 
+import contextlib
+import errno
 import os
 import re
+import shutil
 import struct
 
 import numpy as np
@@ -12,6 +15,7 @@ STARTS = (b"RIFF", b"RIFX", b"RF64", b"FORM", b"fLaC", b"OggS", b".snd", b"caff"
 ENDINGS = (".wav", ".wave", ".flac", ".aif", ".aiff", ".aifc", ".ogg", ".oga", ".opus", ".mp3", ".au",
            ".snd", ".caf", ".w64", ".rf64", ".voc")
 FRAMES_AT_ONCE = 1 << 20
+FULL = 1 << 20  # bytes; where no more are free the disk is taken for full
 
 
 def is_audio(path, start):
@@ -59,6 +63,25 @@ def _channel(path, file, channel, first, most, whole, outlines, outline):
             one.add(np.where(np.isfinite(beside), beside, np.nan))
         seen += len(part)
     return np.concatenate(kept) if kept else np.empty(0), seen
+
+
+@contextlib.contextmanager
+def written(path, rate, channels, subtype, kind):
+    """A new audio file to write to. It is whole when the block is left without an exception: where the disk is full
+    libsndfile says "System error", and of the last samples of a FLAC file nothing."""
+    import soundfile
+    try:
+        with soundfile.SoundFile(path, "w", rate, channels, subtype, format=kind) as file:
+            yield file
+            frames = file.frames
+        if soundfile.info(path).frames == frames:
+            return
+        reason = "it was not written as a whole"
+    except soundfile.SoundFileError as error:
+        reason = str(error)
+    if shutil.disk_usage(os.path.dirname(path) or ".").free < FULL:
+        raise OSError(errno.ENOSPC, os.strerror(errno.ENOSPC))
+    raise OSError(reason)
 
 
 def wrong_length(local, frames):

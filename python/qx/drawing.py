@@ -17,6 +17,8 @@ NARROW = 4.6  # inches
 
 
 def pyplot():
+    import logging
+    logging.getLogger("matplotlib").setLevel(logging.ERROR)  # no remarks where the home cannot be written
     import matplotlib
     matplotlib.use("svg")
     import matplotlib.pyplot as plt

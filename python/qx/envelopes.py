@@ -35,6 +35,10 @@ class Envelope:
         self._lows[:half], self._highs[:half] = extremes(self._lows[:self._blocks], 2, self._highs[:self._blocks])
         self._blocks, self.samples = half, 2 * self.samples
 
+    def __getstate__(self):
+        """Without the room for further blocks."""
+        return {**self.__dict__, "_lows": self._lows[:self._blocks], "_highs": self._highs[:self._blocks]}
+
     def bounds(self):
         """The lowest and the highest values of the blocks, the last one perhaps shorter."""
         lows, highs = self._lows[:self._blocks], self._highs[:self._blocks]

@@ -1,22 +1,21 @@
 """What a file is, by its first bytes, and its contents: compressed, from a pipe, or as they are."""
 
 import bz2
+import contextlib
 import gzip
+import io
 import lzma
 import os
 import re
 import shutil
-import sys
 import tempfile
 import zipfile
-import zlib
 
 HEAD = 1 << 16
 PIPE = "-"
 UNPACKING = {b"\x1f\x8b": gzip.open, b"BZh": bz2.open, b"\xfd7zXZ\0": lzma.open}
 ZSTD = b"\x28\xb5\x2f\xfd"
 COMPRESSED = (".gz", ".bz2", ".xz", ".zst", ".zip")
-BROKEN = (EOFError, zlib.error, lzma.LZMAError, zipfile.BadZipFile, gzip.BadGzipFile)
 
 # What begins so is read by stored.py ...
 ARRAYS = ((b"\x93NUMPY", "npy"), (b"\x89HDF\r\n\x1a\n", "hdf5"), (b"PAR1", "parquet"),
@@ -41,8 +40,20 @@ BINARY = {"an ORC table", "an MP4 video or sound", "an ABF recording", "an Arrow
           "an MDF recording"}
 
 
+CONTROL = re.compile("[\x00-\x1f\x7f-\x9f\u061c\u200e\u200f\u2028-\u202e\u2066-\u2069\ud800-\udfff]")
+
+
+def printable(text):
+    """A text of a file, or the name of one, without what a terminal takes for a command and without marks that
+    turn its direction."""
+    return CONTROL.sub(lambda found: " " if found[0] in "\t\n\r" else "\N{REPLACEMENT CHARACTER}", text)
+
+
 class InputError(Exception):
-    """What is wrong with an input, with file and line."""
+    """What is wrong with an input, with file and line; one line that a terminal may show."""
+
+    def __init__(self, text=""):
+        super().__init__(printable(text))
 
 
 def needs(what, package):
@@ -50,18 +61,48 @@ def needs(what, package):
     return InputError(f"{what}: reading needs {package}")
 
 
-class Source:
-    """The contents of a file, or of standard input for "-". A context manager: copies end with it."""
+@contextlib.contextmanager
+def unpacking(path):
+    """What an unpacker raises is an InputError: of a broken file that may be an exception of any kind."""
+    try:
+        yield
+    except (InputError, MemoryError):
+        raise
+    except Exception as error:
+        raise InputError(f"{path}: cannot be unpacked, perhaps cut off: {error or type(error).__name__}") from None
 
-    def __init__(self, path):
-        self.path = os.fspath(path)
+
+class _Unpacked(io.RawIOBase):
+    """A stream that unpacks as it is read."""
+
+    def __init__(self, path, unpack):
+        self._path = path
+        with unpacking(path):
+            self._stream = unpack()
+
+    def readable(self):
+        return True
+
+    def readinto(self, room):
+        with unpacking(self._path):
+            found = self._stream.read(len(room))
+        room[:len(found)] = found
+        return len(found)
+
+    def close(self):
+        if not self.closed:
+            self._stream.close()
+        super().close()
+
+
+class Source:
+    """The contents of a file, which messages call `path`. A context manager: copies end with it."""
+
+    def __init__(self, path, file):
+        self.path, self._file = path, file
         self.name = os.path.basename(self.path)
         self._folder, self._unpack, self._local = None, None, None
-        if self.path == PIPE:
-            self.path = self.name = "standard input"
-            self._file = self._copy(sys.stdin.buffer)
-        else:
-            self._file = self.path
+        self._open = contextlib.ExitStack()
         if not os.path.exists(self._file):
             raise InputError(f"{self.path}: no such file")
         if os.path.isdir(self._file):
@@ -74,6 +115,7 @@ class Source:
         return self
 
     def __exit__(self, *_):
+        self._open.close()
         if self._folder:
             self._folder.cleanup()
 
@@ -82,8 +124,11 @@ class Source:
         if not self._folder:
             self._folder = tempfile.TemporaryDirectory(prefix="qx-")
         handle, path = tempfile.mkstemp(dir=self._folder.name)
-        with open(handle, "wb") as file:
-            shutil.copyfileobj(stream, file, 1 << 20)
+        try:
+            with open(handle, "wb") as file:
+                shutil.copyfileobj(stream, file, 1 << 20)
+        except OSError as error:
+            raise InputError(f"{self.path}: cannot be unpacked into {tempfile.gettempdir()}: {error.strerror}") from None
         return path
 
     def _look_inside(self):
@@ -94,7 +139,7 @@ class Source:
         if self.head.startswith(ZSTD):
             self._unpack = self._zstd
         if self.head.startswith(b"PK\x03\x04"):
-            with zipfile.ZipFile(self._file) as archive:
+            with unpacking(self.path), zipfile.ZipFile(self._file) as archive:
                 self.members = [name for name in archive.namelist()
                                 if not name.endswith("/") and not name.startswith("__MACOSX/")]
             if len(self.members) == 1 and not self.members[0].endswith(".npy"):
@@ -112,7 +157,7 @@ class Source:
 
     def open(self):
         """The contents as a stream of bytes from the start."""
-        return self._unpack() if self._unpack else open(self._file, "rb")
+        return io.BufferedReader(_Unpacked(self.path, self._unpack), 1 << 18) if self._unpack else open(self._file, "rb")
 
     def local(self):
         """The path of a file that holds the contents as they are."""
@@ -122,6 +167,10 @@ class Source:
             with self.open() as stream:
                 self._local = self._copy(stream)
         return self._local
+
+    def keep(self, file):
+        """An open file, which is closed when the contents are left."""
+        return self._open.enter_context(file)
 
     def kind(self):
         """The kind that stored.py reads, or an empty text; what nobody reads is refused by its name."""
@@ -149,7 +198,7 @@ class Source:
         if "xl/workbook.xml" in names:
             return "xlsx"
         if "mimetype" in names and "content.xml" in names:
-            with zipfile.ZipFile(self._file) as archive:
+            with unpacking(self.path), zipfile.ZipFile(self._file) as archive:
                 if b"spreadsheet" in archive.read("mimetype"):
                     return "ods"
         if "[Content_Types].xml" in names or "mimetype" in names:

@@ -6,9 +6,9 @@ from typing import Any
 
 import numpy as np
 
-from . import drawing, figures, recording
+from . import drawing, figures, isolation, recording
 from . import fit as topic
-from .files import InputError
+from .files import InputError, printable
 from .sections import number, uncertain
 
 METHODS = ("least squares", "absolute", "bisquare")
@@ -57,7 +57,7 @@ def parameters_of(model, order=2):
 
 def _label(layout, column):
     name, unit = layout.names[column] or f"column {column + 1}", layout.units[column]
-    return f"{name} ({unit})" if unit else name
+    return printable(f"{name} ({unit})" if unit else name)
 
 
 def read(path, x=None, y=None, weights=None, decimal=None, missing=None, time=None, dates=None,
@@ -65,7 +65,11 @@ def read(path, x=None, y=None, weights=None, decimal=None, missing=None, time=No
     """Two columns of a table, and a third one with weights. Each is a name or a number from 1; x is the column
     `time`, the first one where neither is said, and y the first other one. With `time` "none", and for a table
     of one column, x is the number of the row. The others are as in recording.read."""
-    with recording.opened(path) as source:
+    return isolation.read(_read, path, x, y, weights, decimal, missing, time, dates, thousands)
+
+
+def _read(_, path, file, x, y, weights, decimal, missing, time, dates, thousands):
+    with recording.opened(path, file) as source:
         options = {"decimal": decimal, "missing": missing, "dates": dates, "thousands": thousands}
         x = x if time in (None, "none") else time
         reader = recording.table_of(source, time, options, x, y, weights)

@@ -75,10 +75,10 @@ def write(path, samples, rate):
             np.savetxt(part, np.column_stack([times, samples]), "%.17g", ",",
                        header="time [s],x", comments="")
     elif ending == "wav":
-        import soundfile
+        from . import audio
         if rate != int(rate):
             raise ValueError(f"a WAV file needs a whole number of samples per second, not {rate}")
-        with outputs.whole(path) as part:
-            soundfile.write(part, samples, int(rate), "FLOAT", format="WAV")
+        with outputs.whole(path) as part, audio.written(part, int(rate), 1, "FLOAT", "WAV") as file:
+            file.write(samples)
     else:
         raise ValueError(f"{path}: the name must end in .csv or .wav")

@@ -16,7 +16,7 @@ from pathlib import Path
 
 from . import outputs
 from .audio import ENDINGS as AUDIO
-from .files import COMPRESSED, InputError
+from .files import COMPRESSED, InputError, printable
 from .stored import ENDINGS as STORED
 
 TABLES = (".csv", ".txt", ".tsv", ".tab", ".dat", ".asc", ".prn")
@@ -63,7 +63,7 @@ def files_of(paths):
     for given in paths:
         if os.path.isdir(given):
             inside = [path for path in Path(given).rglob("*") if path.is_file() and is_recording(path)]
-            found |= {str(path): path.relative_to(given) for path in inside}
+            found |= {str(path): path.relative_to(given) for path in inside if not outputs.UNFINISHED.match(path.name)}
         elif is_pattern(given):
             found |= {path: Path(path) for path in glob.glob(given, recursive=True) if os.path.isfile(path)}
         else:
@@ -92,7 +92,7 @@ def report_on(name, path, options):
     except InputError as error:
         return Outcome(name, failure=str(error))
     except Exception as error:  # whatever it is, the others go on
-        return Outcome(name, failure=f"{path}: {type(error).__name__}: {error}")
+        return Outcome(name, failure=printable(f"{path}: {type(error).__name__}: {error}"))
 
 
 @contextlib.contextmanager
@@ -150,7 +150,7 @@ def outcomes(pairs, options, workers=None, scheduler=None):
             died = []
             yield from _finished(executor, [pair], options, died)
         for name, path in died:
-            yield Outcome(name, failure=f"{path}: its process died, perhaps for want of memory")
+            yield Outcome(name, failure=printable(f"{path}: its process died, perhaps for want of memory"))
 
 
 def _finished(executor, pairs, options, left):
@@ -167,7 +167,10 @@ def _finished(executor, pairs, options, left):
 def index(found, left=()):
     """The page that leads to the others."""
     from . import pages
-    escape = html.escape
+
+    def escape(text, quote=True):
+        return html.escape(printable(text), quote)
+
     header = "".join(f'<th><button type="button">{label}</button></th>' for label in (
         "Recording", "Samples", "Per second", *MAIN))
     rows = "".join(
@@ -188,7 +191,7 @@ def index(found, left=()):
 
 def _link(name):
     from urllib.parse import quote
-    return quote(f"{name}.html")
+    return quote(os.fsencode(f"{name}.html"))
 
 
 def _check(pairs, folder, force):
@@ -207,7 +210,7 @@ def write(paths, folder, options, workers=None, scheduler=None, tell=lambda outc
     _check(pairs, folder, force)
     if start:
         start(len(pairs))
-    os.makedirs(folder, exist_ok=True)
+    outputs.make_folder(folder)
     found = []
     for outcome in outcomes(pairs, options, workers, scheduler):
         if not outcome.failure:

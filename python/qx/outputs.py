@@ -7,6 +7,7 @@ file with the mark may be made anew, so that a command can be repeated.
 
 import contextlib
 import os
+import re
 import stat
 
 MARK = "python3 -m qx"
@@ -18,6 +19,7 @@ class Exists(ValueError):
 
 
 _unfinished = set()
+UNFINISHED = re.compile(r"\.\d+\.part\.")  # how names begin of what a process that was killed has left behind
 
 
 def mark(command):
@@ -72,21 +74,21 @@ def whole(path):
     """The path of a new file beside `path`, which takes its place when the block is left, and is
     removed where that is by an exception. Its name ends as that of `path` does."""
     path = os.path.realpath(path)  # a link stays, and what it leads to is replaced
-    if os.path.exists(path) and not _is_file(path):
-        yield path
-        return
-    folder, name = os.path.split(path)
-    part = os.path.join(folder, f".{os.getpid()}.part.{name}")
     try:
+        if os.path.exists(path) and not _is_file(path):
+            yield path
+            return
+        folder, name = os.path.split(path)
+        part = os.path.join(folder, f".{os.getpid()}.part.{name}")
         os.close(os.open(part, os.O_WRONLY | os.O_CREAT | os.O_EXCL, 0o666))
+        _unfinished.add(part)
+        try:
+            yield part
+            os.replace(part, path)
+        finally:
+            forget(part)
     except OSError as error:
-        raise OSError(f"{path}: cannot be written: {error.strerror}") from None
-    _unfinished.add(part)
-    try:
-        yield part
-        os.replace(part, path)
-    finally:
-        forget(part)
+        raise OSError(f"{path}: cannot be written: {error.strerror or error}") from None
 
 
 def forget(part):
@@ -101,10 +103,17 @@ def forget_all():
         forget(part)
 
 
+def make_folder(path):
+    try:
+        os.makedirs(path, exist_ok=True)
+    except OSError as error:
+        raise OSError(f"{path}: cannot be made: {error.strerror}") from None
+
+
 def write_text(path, text):
     folder = os.path.dirname(path)
     if folder:
-        os.makedirs(folder, exist_ok=True)
+        make_folder(folder)
     with whole(path) as part, open(part, "w", encoding="utf-8", newline="") as file:
         file.write(text)
 

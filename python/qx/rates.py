@@ -110,10 +110,10 @@ def readings_of(text, habit, small=False, continental=False):
     """The numbers that a text may be: one, two where a mark may group thousands or begin decimals, none
     where its groups are none. `small` says that thousands are unlikely, as of kilohertz; `continental` that
     the words are those of a language with decimal commas."""
-    mantissa, exponent = text, 0
+    mantissa, exponent = text, ""
     if match := re.search(r"(?:[eE]|\s?[x×*·]\s?10\^?)([-+]?\d+)$", text):
-        mantissa, exponent = text[:match.start()], int(match[1])
-    scale = 10.0 ** exponent
+        mantissa, exponent = text[:match.start()], match[1]
+    scale = float(f"1e{exponent or 0}")  # 0 or infinite perhaps
     mantissa = re.sub(rf"[{BLANKS}’]", "'", mantissa.strip())
     marks = [mark for mark in mantissa if mark in ".,'"]
     if not marks:
@@ -128,13 +128,18 @@ def readings_of(text, habit, small=False, continental=False):
     if len(kinds) > 1:
         return ()
     small_one, large_one = float(f"{whole or '0'}.{fraction}") * scale, float((whole or "0") + fraction) * scale
-    if exponent or not _grouped(mantissa, last):
+    if exponent.strip("+-0") or not _grouped(mantissa, last):
         return (small_one,)
     if habit.thousands and habit.told != last:
         return (large_one,)
     if habit.told:
         return (small_one,) if habit.told == last else (large_one,)
     return _by_habit(last, large_one, small_one, habit, small, continental)
+
+
+def _is_measured(value):
+    """Whether a number is one that a rate or an interval can be, and its reciprocal is none beyond all numbers."""
+    return 1e-300 < value < 1e300
 
 
 def _grouped(text, mark):
@@ -189,8 +194,8 @@ def named_in(text, habit=Habit()):
             scales, inverse = _scales(match)
             numbers = readings_of(match["number"], habit, inverse or max(scales) > 1,
                                   bool(CONTINENTAL.search(match[0])))
-            found.append(Named(match[0].strip(), tuple(1 / (n * s) if inverse else n * s for n in numbers if n
-                                                       for s in scales)))
+            found.append(Named(match[0].strip(), tuple(1 / (n * s) if inverse else n * s for n in numbers
+                                                       if _is_measured(n) for s in scales)))
     if not found and not taken and (perhaps := PERHAPS.search(text)):
         remarks.append(f"'{perhaps[0]}' may be the sampling rate or not")
     return [one for one in found if not one.readings or min(one.readings) > 0], remarks
@@ -247,7 +252,8 @@ def _keyed(text, match, habit):
     numbers = readings_of(match["number"], habit, inverse or max(scales) > 1, bool(CONTINENTAL.search(match[0])))
     numbers = [n / float(over[1]) for n in numbers] if over and float(over[1]) else numbers
     factor = float(match["divisor"] or 1)
-    if min(numbers, default=1) <= 0 or factor <= 0:
+    values = [n * s for n in numbers for s in scales]
+    if factor <= 0 or not all(map(_is_measured, values)):
         return None, ""
-    rates = tuple(factor / (n * s) if inverse else factor * n * s for n in numbers for s in scales)
+    rates = tuple(factor / value if inverse else factor * value for value in values)
     return Named(words, rates, assumed), ""

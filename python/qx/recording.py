@@ -6,15 +6,16 @@ docs/recordings.md has the rules.
 """
 
 import contextlib
+import csv
 import dataclasses
 import os
 import re
 
 import numpy as np
 
-from . import audio, files, rates, stored, tables, times
+from . import audio, files, isolation, rates, stored, tables, times
 from .envelopes import Envelope
-from .files import InputError  # noqa: F401, for those who read recordings
+from .files import InputError, printable
 from .wholes import Whole
 
 WIDEST = 1e307  # with the margins of a plot still a double
@@ -65,8 +66,13 @@ def read(path, rate=None, column=None, decimal=None, missing=None, start=0, time
     digits groups thousands; `dates` is "dmy" or "mdy" for dates that may be either; `missing` values are
     refused, or "skip" or "interpolate"; `start` samples are left out. `outline` makes what the values of each
     channel are added to: the `envelope` of the recording and of the other channels; `progress` is told of each
-    part how many samples it has."""
-    with opened(path) as source:
+    part how many samples it has. The file is read in a process of its own, with limits (qx/isolation.py)."""
+    return isolation.read(_read, path, rate, column, decimal, missing, start, time, dates, thousands, outline,
+                          told=progress)
+
+
+def _read(progress, path, file, rate, column, decimal, missing, start, time, dates, thousands, outline):
+    with opened(path, file) as source:
         if audio.is_audio(source.name, source.head):
             recording = _of_audio(source, column, start, outline, progress)
         else:
@@ -83,20 +89,29 @@ def read(path, rate=None, column=None, decimal=None, missing=None, start=0, time
             else f"the sampling rate is not known: {recording.rate_source or 'nothing names one'}"
                  " (--rate sets it)")
     recording.choice = recording.choice.replace("{rate}", said)
+    return _shown(recording)
+
+
+def _shown(recording):
+    """The recording with what the file says as texts that may be shown."""
+    for one in (recording, *recording.others):
+        one.channel, one.unit = printable(one.channel), printable(one.unit)
+    recording.name, recording.choice = printable(recording.name), printable(recording.choice)
+    recording.rate_source, recording.notes = printable(recording.rate_source), list(map(printable, recording.notes))
     return recording
 
 
 @contextlib.contextmanager
-def opened(path):
-    """The contents of a file (files.Source). What goes wrong with the file itself is an InputError."""
-    name = "standard input" if path == files.PIPE else path
+def opened(path, file):
+    """The contents of a file (files.Source), which messages call `path`. What goes wrong with the file itself is an
+    InputError."""
     try:
-        with files.Source(path) as source:
+        with files.Source(path, file) as source:
             yield source
-    except files.BROKEN as error:
-        raise InputError(f"{name}: cannot be unpacked, perhaps cut off: {error}") from None
+    except csv.Error as error:
+        raise InputError(f"{path}: cannot be cut into cells: {error}") from None
     except OSError as error:
-        raise InputError(f"{name}: cannot be read: {error.strerror or error}") from None
+        raise InputError(f"{path}: cannot be read: {error.strerror or error}") from None
 
 
 def table_of(source, time, options, *wanted):

@@ -1,13 +1,17 @@
 """Audio files at another sampling rate, in blocks: the memory does not depend on the length."""
 
+import contextlib
+import dataclasses
 import math
 import os
+from typing import Any
 
 import numpy as np
 import soundfile
 
-from . import outputs
+from . import audio, isolation, outputs
 from .calls import call
+from .files import InputError
 from .multirate import low_pass
 
 FRAMES_AT_ONCE = 1 << 15
@@ -31,6 +35,7 @@ class Resampler:
         self.channels = channels
         self.read = self.written = 0
         self.clipped, self.highest, self.format_note = 0, 0.0, ""
+        self.sound, self.wrong = None, ""
         self.reset, self.offset, self.count, self.state = 1, 0, 0, np.zeros((0, 0))
 
     def put(self, frames):
@@ -55,14 +60,31 @@ class Resampler:
         return resampled.T
 
 
-def opened(path):
-    if not os.path.exists(path):
-        raise OSError(f"{path}: no such file")
+@dataclasses.dataclass
+class Sound:
+    """What the header of an audio file says."""
+    samplerate: int
+    channels: int
+    frames: int
+    subtype: str
+
+
+def _read(tell, path, file):
+    """Tells the Sound and then its frames, block by block. What is wrong with the lengths that the file announces is
+    the result."""
+    if not os.path.exists(file):
+        raise InputError(f"{path}: no such file")
+    read = 0
     try:
-        return soundfile.SoundFile(path)
+        with soundfile.SoundFile(file) as source:
+            tell(Sound(source.samplerate, source.channels, source.frames, source.subtype))
+            while len(frames := source.read(FRAMES_AT_ONCE, always_2d=True)):
+                tell(frames)
+                read += len(frames)
     except soundfile.SoundFileError as error:
         reason = getattr(error, "error_string", error)
-        raise OSError(f"{path}: cannot be read as audio: {reason}") from None
+        raise InputError(f"{path}: cannot be read as audio: {reason}") from None
+    return audio.wrong_length(file, read)
 
 
 def format_for(target, source, rate):
@@ -83,31 +105,54 @@ def format_for(target, source, rate):
     return kind, "PCM_24" if SAMPLE_BYTES.get(source.subtype, 0) > 2 or source.subtype in REALS else "PCM_16"
 
 
-def resample_file(source, target, rate, progress=lambda frames: None):
-    """Writes the sound of the open file `source` to `target`, in the format that its ending names and
-    the same sample format if that has it; the file appears when it is whole. `progress` is told of
-    frames as they are read. The stream that did it is the result: `clipped` samples were beyond full
-    scale, the farthest at `highest` times that."""
-    resampler = Resampler(source.samplerate, rate, source.channels)
-    kind, subtype = format_for(target, source, rate)
-    if subtype != source.subtype:
-        resampler.format_note = f", {subtype} in place of {source.subtype}"
+class _Resampled:
+    """The new file, written as the blocks of the old one come; it appears when it is whole."""
 
-    def put(out, frames):
-        if subtype not in REALS:
+    def __init__(self, target, rate, begun, progress, stack):
+        self._target, self._rate, self._begun, self._progress = target, rate, begun, progress
+        self._stack = stack
+        self._out: Any = None
+        self.resampler: Any = None
+
+    def take(self, told):
+        """The Sound, then its blocks."""
+        if self._out is None:
+            self._begin(told)
+        else:
+            self._put(self.resampler.put(told))
+            self._progress(len(told))
+
+    def _begin(self, sound):
+        self.resampler = resampler = Resampler(sound.samplerate, self._rate, sound.channels)
+        resampler.sound = sound
+        kind, subtype = format_for(self._target, sound, self._rate)
+        if subtype != sound.subtype:
+            resampler.format_note = f", {subtype} in place of {sound.subtype}"
+        self._counts = subtype not in REALS
+        part = self._stack.enter_context(outputs.whole(self._target))
+        self._out = self._stack.enter_context(audio.written(part, self._rate, sound.channels, subtype, kind))
+        self._begun(sound)
+
+    def _put(self, frames):
+        if self._counts:
             beyond = np.abs(frames).max(initial=0)
             if beyond > 1:
-                resampler.clipped += int(np.count_nonzero(np.abs(frames) > 1))
-                resampler.highest = max(resampler.highest, float(beyond))
-        out.write(frames)
+                self.resampler.clipped += int(np.count_nonzero(np.abs(frames) > 1))
+                self.resampler.highest = max(self.resampler.highest, float(beyond))
+        self._out.write(frames)
 
-    try:
-        with outputs.whole(target) as part, \
-                soundfile.SoundFile(part, "w", rate, source.channels, subtype, format=kind) as out:
-            while len(frames := source.read(FRAMES_AT_ONCE, always_2d=True)):
-                put(out, resampler.put(frames))
-                progress(len(frames))
-            put(out, resampler.end())
-    except soundfile.SoundFileError as error:
-        raise OSError(f"{target}: cannot be written: {error}") from None
-    return resampler
+    def end(self):
+        self._put(self.resampler.end())
+
+
+def resample_file(source, target, rate, progress=lambda frames: None, begun=lambda sound: None):
+    """Writes the sound of the file `source` to `target`, in the format that its ending names and the same sample
+    format if that has it; the file appears when it is whole. `begun` is told the Sound, `progress` of frames as
+    they are read. The stream that did it is the result: its `sound`, what is `wrong` with the lengths that the file
+    announces, and how many samples were `clipped`, the farthest at `highest` times full scale."""
+    with contextlib.ExitStack() as stack:
+        made = _Resampled(target, rate, begun, progress, stack)
+        wrong = isolation.read(_read, source, told=made.take)
+        made.end()
+    made.resampler.wrong = wrong
+    return made.resampler

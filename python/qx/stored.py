@@ -4,6 +4,7 @@ NumPy's files need nothing else. The others need a package each, which is loaded
 missing the refusal names it.
 """
 
+import contextlib
 import datetime
 import io
 import re
@@ -29,6 +30,18 @@ def rate_in(note):
     return Named(note, (float(number[1]),), "" if number[2] else "hertz")
 
 
+@contextlib.contextmanager
+def reading(path, what=""):
+    """What a reader raises is an InputError: of a broken file that may be an exception of any kind."""
+    try:
+        yield
+    except (InputError, MemoryError):
+        raise
+    except Exception as error:
+        said = error.strerror if isinstance(error, OSError) and error.strerror else error
+        raise InputError(f"{path}: cannot be read{f' as {what}' if what else ''}: {said or type(error).__name__}") from None
+
+
 class Arrays:
     """Columns of arrays with the face of a tables.Reader. A column is a function of a slice."""
 
@@ -39,7 +52,8 @@ class Arrays:
         self.comments, self.notes, self.told = notes, notes, list(told)
         self.missing, self.origins = None, {}
         self.length = columns[0].length
-        sample = [column.values(slice(0, SAMPLE)) for column in columns]
+        with reading(self.path):
+            sample = [column.values(slice(0, SAMPLE)) for column in columns]
         body = [[repr(float(cell)) for cell in row] for row in zip(*sample)]
         self.layout = Layout(None, ".", 1, [column.name for column in columns], [column.unit for column in columns],
                              notes, body, shown=".")
@@ -54,8 +68,9 @@ class Arrays:
         start = 0
         while start < self.length:
             part = slice(start, min(start + ROWS_AT_ONCE, self.length))
-            values = {c: self._values(c, part) for c in columns}
-            values |= {c: self._or_none(c, part) for c in beside}
+            with reading(self.path):
+                values = {c: self._values(c, part) for c in columns}
+                values |= {c: self._or_none(c, part) for c in beside}
             yield values, np.arange(part.start + 1, part.stop + 1)
             start = part.stop
 
@@ -133,13 +148,14 @@ def assembled(source, arrays, notes, wanted):
     """The table of the columns of one length: those among which a wanted column is, else the longest. `arrays`
     are triples of name, array and unit."""
     path, columns = source.path, []
-    for name, data, unit in arrays:
-        if np.ndim(data) == 0 or np.size(data) == 1 and not getattr(data.dtype, "names", None):
-            value = np.asarray(data).reshape(-1)[0]
-            if np.asarray(value).dtype.kind in "iuf":
-                notes.append(f"{name.split('/')[-1]} = {float(value):.17g}" + (f" {unit}" if unit else ""))
-            continue
-        columns += columns_of(path, name, data, unit)
+    with reading(path):
+        for name, data, unit in arrays:
+            if np.ndim(data) == 0 or np.size(data) == 1 and not getattr(data.dtype, "names", None):
+                value = np.asarray(data).reshape(-1)[0]
+                if np.asarray(value).dtype.kind in "iuf":
+                    notes.append(f"{name.split('/')[-1]} = {float(value):.17g}" + (f" {unit}" if unit else ""))
+                continue
+            columns += columns_of(path, name, data, unit)
     if not columns:
         raise InputError(f"{path}: holds no array of numbers")
     lengths = {column.length for column in columns if wanted and column.name in wanted}
@@ -150,19 +166,14 @@ def assembled(source, arrays, notes, wanted):
 
 
 def read_npy(source, wanted):
-    try:
+    with reading(source.path):
         array = np.load(source.local(), mmap_mode="r", allow_pickle=False)
-    except ValueError as error:
-        raise InputError(f"{source.path}: cannot be read: {error}") from None
     return assembled(source, [("", array, "")], [], wanted)
 
 
 def read_npz(source, wanted):
-    try:
-        with np.load(source.local(), allow_pickle=False) as file:
-            arrays = [(name, file[name], "") for name in file.files]
-    except ValueError as error:
-        raise InputError(f"{source.path}: cannot be read: {error}") from None
+    with reading(source.path), np.load(source.local(), allow_pickle=False) as file:
+        arrays = [(name, file[name], "") for name in file.files]
     return assembled(source, arrays, [], wanted)
 
 
@@ -171,10 +182,8 @@ def read_mat(source, wanted):
         import scipy.io
     except ImportError:
         raise needs(f"{source.path}: a MAT file", "the package python3-scipy") from None
-    try:
+    with reading(source.path, "a MAT file"):
         found = scipy.io.loadmat(source.local(), squeeze_me=True)
-    except Exception as error:  # of many kinds for a broken file
-        raise InputError(f"{source.path}: cannot be read as a MAT file: {error}") from None
     arrays = []
     for name, value in found.items():
         if name.startswith("__"):
@@ -195,10 +204,13 @@ def read_hdf5(source, wanted):
         import h5py
     except ImportError:
         raise needs(f"{source.path}: an HDF5 file", "the package python3-h5py") from None
-    try:
-        file = h5py.File(source.local(), "r")  # stays open: its arrays are read in parts
-    except OSError as error:
-        raise InputError(f"{source.path}: cannot be read as HDF5: {error}") from None
+    with reading(source.path, "HDF5"):
+        arrays, notes = _contents_of_hdf5(h5py, source)
+    return assembled(source, arrays, notes, wanted)
+
+
+def _contents_of_hdf5(h5py, source):
+    file = source.keep(h5py.File(source.local(), "r"))  # its arrays are read in parts
     arrays, notes = [], [*_attributes(file)]
 
     def visit(name, item):
@@ -213,7 +225,7 @@ def read_hdf5(source, wanted):
             if item.size:
                 arrays.append((name, value, unit))
     file.visititems(visit)
-    return assembled(source, arrays, notes, wanted)
+    return arrays, notes
 
 
 def _attributes(item):
@@ -229,12 +241,11 @@ def _attributes(item):
 
 def read_parquet(source, wanted):
     import pandas
-    try:
-        frame = pandas.read_parquet(source.local())
-    except ImportError:
-        raise needs(f"{source.path}: a Parquet table", "pyarrow (pip install pyarrow)") from None
-    except Exception as error:
-        raise InputError(f"{source.path}: cannot be read as Parquet: {error}") from None
+    with reading(source.path, "Parquet"):
+        try:
+            frame = pandas.read_parquet(source.local())
+        except ImportError:
+            raise needs(f"{source.path}: a Parquet table", "pyarrow (pip install pyarrow)") from None
     if frame.index.dtype.kind == "M":
         frame = frame.reset_index()
     arrays = []
@@ -269,11 +280,9 @@ def read_edf(source, wanted):
         kind = "bdf" if head[:1] == b"\xff" else "edf"
         path = os.path.join(folder, f"recording.{kind}")  # its reader goes by the ending
         shutil.copy(source.local(), path)
-        try:
+        with reading(source.path, "EDF or BDF"):
             raw = getattr(mne.io, f"read_raw_{kind}")(path, preload=True, verbose="error")
-        except Exception as error:
-            raise InputError(f"{what} that cannot be read: {error}") from None
-        data, units = raw.get_data(), getattr(raw, "_orig_units", {})
+            data, units = raw.get_data(), getattr(raw, "_orig_units", {})
     arrays = [(name, values, "V" if "V" in units.get(name, "") else "") for name, values in zip(raw.ch_names, data)]
     return assembled(source, arrays, [f"sampling rate = {raw.info['sfreq']:.17g} Hz"], wanted)
 
@@ -345,17 +354,13 @@ class _Text:
 def read_sheets(source, kind, options):
     """The first sheet with numbers as a table."""
     names, chosen = [], None
-    try:
+    with reading(source.path, "a workbook"):
         for name, rows in SHEETS[kind](source):
             names.append(name)
             if chosen is None:
                 lines = [[_cell(value) for value in row] for row in rows]
                 if any(cell and cell.lstrip("-")[:1].isdigit() for line in lines for cell in line):
                     chosen = name, lines
-    except InputError:
-        raise
-    except Exception as error:  # of many kinds for a broken file
-        raise InputError(f"{source.path}: cannot be read as a workbook: {error}") from None
     if chosen is None:
         raise InputError(f"{source.path}: holds no numbers")
     name, lines = chosen

@@ -6,6 +6,7 @@ the columns that are asked for.
 """
 
 import collections
+import contextlib
 import csv
 import dataclasses
 import io
@@ -14,7 +15,7 @@ import re
 
 import numpy as np
 
-from .files import InputError, Source
+from .files import InputError
 from .rates import seconds_of
 from .times import CLOCK, ONLY_DIGITS, SLASHED, TIME_OF_DAY, TWO_FIELDS, Format
 
@@ -324,7 +325,6 @@ class Reader:
     where = "a comment of the file"
 
     def __init__(self, source, decimal=None, missing=None, dates=None, thousands=False):
-        source = source if hasattr(source, "open") else Source(source)
         self.source, self.path, self.name = source, source.path, source.name
         self.missing, self.dates = missing, dates
         self.named_as_time = None  # the number of a column that is time whatever its name is
@@ -361,9 +361,14 @@ class Reader:
                 self.layout.names = cells
                 return
 
+    @contextlib.contextmanager
     def _open(self):
-        return io.TextIOWrapper(self.source.open(), encoding=self.encoding, newline=None,
-                                errors="strict" if self.encoding != "cp1252" else "replace")
+        try:
+            with io.TextIOWrapper(self.source.open(), encoding=self.encoding, newline=None,
+                                  errors="strict" if self.encoding != "cp1252" else "replace") as file:
+                yield file
+        except UnicodeError:
+            raise InputError(f"{self.path}: is no text in {self.encoding} throughout") from None
 
     def _parts_of_lines(self):
         """The line numbers and texts of the lines of data, part by part, and how they are cut."""
@@ -399,14 +404,11 @@ class Reader:
 
     def _lines(self, lines):
         """The numbers and texts of the next lines of data."""
-        try:
-            while part := list(itertools.islice(lines, LINES_AT_ONCE)):
-                numbers = [n for n, line in part if line.strip() and not is_comment(line.lstrip())]
-                if numbers:
-                    first = part[0][0]
-                    return numbers, [part[n - first][1].rstrip("\n") for n in numbers]
-        except UnicodeError:
-            raise InputError(f"{self.path}: is no text in {self.encoding} throughout") from None
+        while part := list(itertools.islice(lines, LINES_AT_ONCE)):
+            numbers = [n for n, line in part if line.strip() and not is_comment(line.lstrip())]
+            if numbers:
+                first = part[0][0]
+                return numbers, [part[n - first][1].rstrip("\n") for n in numbers]
         return None
 
     def _converted(self, numbers, lines, columns, separator, width):
@@ -448,8 +450,12 @@ class Reader:
             float_precision="round_trip", engine="c", skip_blank_lines=False)[column].to_numpy()
 
     def _cells(self, lines, column, separator, width):
-        return [str(cell).strip().strip('"').strip()
-                for cell in self._read(lines, column, separator, width, str)]
+        import pandas
+        try:
+            cells = self._read(lines, column, separator, width, str)
+        except pandas.errors.ParserError as error:  # of quotation marks
+            raise InputError(f"{self.path}: cannot be cut into cells: {error}") from None
+        return [str(cell).strip().strip('"').strip() for cell in cells]
 
     def _hold_width(self, numbers, lines, separator, width):
         if separator is None:

@@ -3,6 +3,7 @@
 Texts become nanoseconds since 1970, or since midnight where there is no date. What order day and month have,
 and whether two fields are minutes and seconds, is decided by all texts of a column (Format.settle)."""
 
+import contextlib
 import datetime
 import functools
 import math
@@ -91,9 +92,12 @@ class Format:
         if dates and not self.order:
             self.order = ("dmy" if any(int(first) > 12 for first, _, _ in dates) else
                           "mdy" if any(int(second) > 12 for _, second, _ in dates) else self._rising(dates))
+            either = {date: text for date, text in dates.items() if int(date[0]) and int(date[1])}
+            if not self.order and not either:
+                self.order = "dmy"  # in which they are no dates, either
             if not self.order:
-                text = next(iter(dates.values()))
-                day, month, _ = next(iter(dates))
+                text = next(iter(either.values()))
+                day, month, _ = next(iter(either))
                 names = "January February March April May June July August September October November December"
                 return (f"'{text}' may be {int(day)} {names.split()[int(month) - 1]} or "
                         f"{names.split()[int(day) - 1]} {int(month)}: --dates dmy or --dates mdy says which")
@@ -116,9 +120,10 @@ class Format:
             return "dmy"
         rising = []
         for order in ("dmy", "mdy"):
-            days = [_days(text, order) for text in dates.values()]
-            if all(sooner < later for sooner, later in zip(days, days[1:])):
-                rising.append(order)
+            with contextlib.suppress(ValueError):  # where one is no date in this order
+                days = [_days(text, order) for text in dates.values()]
+                if all(sooner < later for sooner, later in zip(days, days[1:])):
+                    rising.append(order)
         return rising[0] if len(rising) == 1 else None
 
     def nanoseconds(self, cell):
@@ -135,7 +140,7 @@ class Format:
         except ValueError:
             return None
         if part["h"] is None and part["hc"] is None:
-            return total if day else None
+            return total if day and abs(total) < 1 << 62 else None
         hours, minutes = int(part["h"] or part["hc"]), int(part["m"] or part["mc"])
         seconds, fraction = int(part["s"] or part["sc"] or 0), part["f"] or part["fc"]
         if part["h"] and part["s"] is None and not day and (fraction or self.fields == "m"):
@@ -152,7 +157,7 @@ class Format:
         if zone := part["zone"]:
             shift = (int(zone[1:3]) * 60 + int(zone[-2:])) * 60 * 10**9
             total += -shift if zone[0] == "+" else shift
-        return total
+        return total if abs(total) < 1 << 62 else None
 
     def parse(self, cells):
         """The nanoseconds of cells, and the index of the first that is no time or None."""

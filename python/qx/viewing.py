@@ -32,7 +32,11 @@ class Levels:
 
     def add(self, values):
         values = np.ascontiguousarray(values, float)
-        values.tofile(self._file)
+        try:
+            self._file.write(values.data)
+            self._file.flush()
+        except OSError as error:
+            raise InputError(f"the samples cannot be kept in {tempfile.gettempdir()}: {error.strerror}") from None
         self.count += len(values)
         values = np.concatenate([self._rest, values])
         whole = len(values) // BLOCK * BLOCK

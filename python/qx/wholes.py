@@ -108,6 +108,9 @@ class Whole:
         self.histogram.add(values)
         self.spectrum.add(values)
 
+    def __getstate__(self):
+        return {**self.__dict__, "_progress": None, "_waiting": []}
+
     @property
     def mean(self):
         return self.total / self.count

@@ -26,9 +26,10 @@ import zstandard
 PYTHON = Path(__file__).resolve().parent.parent
 sys.path.insert(0, str(PYTHON))
 from qx import __main__ as command  # noqa: E402
-from qx import recording  # noqa: E402
+from qx import isolation, recording  # noqa: E402
 from qx.commands import reading  # noqa: E402
 
+HERE = mock.patch.object(isolation, "AVAILABLE", False)  # files are read in this process, with what is put into it
 CASES = Path(__file__).resolve().parent / "data/recordings.txt"
 
 
@@ -203,7 +204,7 @@ class WhatProgramsKeep(InFolder):
         path = self.folder / "a.parquet"
         path.write_bytes(b"PAR1" + bytes(9))
         frame = pandas.DataFrame({"t (ms)": np.arange(0, 400, 4), "u": RAMP, "label": ["x"] * 100})
-        with mock.patch.object(pandas, "read_parquet", lambda _: frame):
+        with HERE, mock.patch.object(pandas, "read_parquet", lambda _: frame):
             self.holds(path, 250, says=["column 2 of 2, u"])
 
     @unittest.skipUnless(importlib.util.find_spec("mne"), "python3-mne is not installed")
@@ -250,7 +251,7 @@ class WhatProgramsKeep(InFolder):
                 (b"\x89HDF\r\n\x1a\n" + bytes(600), "h5py", "python3-h5py"), (edf, "mne", "python3-mne"),
                 (b"PAR1" + bytes(90), "pyarrow", "pyarrow (pip install pyarrow)"),
                 (b"a MAT-file".ljust(200, b" "), "scipy.io", "python3-scipy")):
-            with self.subTest(module), mock.patch.dict(sys.modules, {module: None, "fastparquet": None}):
+            with self.subTest(module), HERE, mock.patch.dict(sys.modules, {module: None, "fastparquet": None}):
                 path = self.folder / "data.bin"
                 path.write_bytes(content)
                 self.refuses(path, f"reading needs {'the package ' * package.startswith('python3')}{package}")

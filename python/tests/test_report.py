@@ -20,8 +20,8 @@ PYTHON = Path(__file__).resolve().parent.parent
 sys.path.insert(0, str(PYTHON))
 import qx  # noqa: E402
 from qx import __main__ as command  # noqa: E402
-from qx import audio, pages, recording, report, sections, sections_recording, sections_spectra  # noqa: E402
-from qx import tables, wholes  # noqa: E402
+from qx import audio, isolation, pages, recording, report, sections, sections_recording  # noqa: E402
+from qx import sections_spectra, tables, wholes  # noqa: E402
 
 ECG = PYTHON.parent / "examples/data/ecg_208_360hz.csv"
 
@@ -163,7 +163,7 @@ class Reading(InFolder):
         lines = [f"{i};{i % 7}" for i in range(1000)]
         lines[700] = "# a comment"
         text = "t;u\n" + "\n".join(lines)
-        with mock.patch.object(tables, "LINES_AT_ONCE", 97):
+        with mock.patch.object(isolation, "AVAILABLE", False), mock.patch.object(tables, "LINES_AT_ONCE", 97):
             read = self.read(text)
             self.assertEqual(read.values.tolist(), [i % 7 for i in range(1000) if i != 700])
             self.assertRaisesRegex(recording.InputError, ":902: column 2, u: 'x' is not a number", self.read,

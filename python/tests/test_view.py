@@ -204,6 +204,32 @@ class InABrowser(InFolder):
         self.assertEqual(len(colours), 2)
         self.no_complaints()
 
+    def test_what_files_say_stays_text(self):
+        """A file, its columns, its notes and its unit are called by what would run if it were taken for a page."""
+        attack = "<img src=x onerror=window.attacked=1>"
+        ends = "</script></title><script>window.attacked=1</script>"
+        path = self.folder / f"{attack}&'\".csv"  # a name has no slash
+        path.write_text(f"# {ends} {attack}\ntime (s);{attack} (<b>);{ends}{attack}\n"
+                        + "".join(f"{i / 10};{i % 7};{i % 5}\n" for i in range(99)))
+        served = self.served(path, ECG)
+        outcome = many.report_on(path.name, str(path), {})
+        index, broken = self.folder / "index.html", many.Outcome(path.name, failure=f"{path}: {attack}")
+        index.write_text(many.index([outcome, broken], [str(path)]), "utf-8")
+        for address, needed in ((self.page(path), "document.title"), (index.as_uri(), "document.body.textContent"),
+                                (served.address, "document.body.textContent"),
+                                (served.address + "0/", "document.title"),
+                                (served.address + "0/", "document.getElementById('sections')?.textContent")):
+            with self.subTest(address=address, needed=needed):
+                self.show(address)
+                self.until(f"return ({needed} || '').includes({json.dumps(attack)})")
+                self.browser.execute_script("typeof figures === 'undefined' || figures.forEach(one => {"
+                                            "one.graph.setSelection(3); one.show([1, 2]) })")
+                time.sleep(0.1)
+                self.assertEqual(self.browser.execute_script(
+                    "const bold = [...document.querySelectorAll('b')].map(one => one.textContent);"
+                    "return [window.attacked, document.querySelectorAll('img[src=x], title ~ script').length,"
+                    "bold.filter(text => !/^[-+.0-9e]+$/.test(text))]"), [None, 0, []])
+
     def test_zooms_in_together_and_shows_the_samples(self):
         self.show(self.page())
         self.browser.execute_script("figures[0].show([10, 10.5])")

@@ -6,10 +6,11 @@
 #   must LABEL LOG COMMAND...      the same; a failure is shown and ends the script
 #   show_failure LOG            the lines of a log that tell why a build failed
 #   lock_cache NAME             waits until no other script holds this lock
+#   lock_file PATH              the same for a lock elsewhere
+#   check_clock ROOT            ends the script where files of a tree are from the future
 #   need_commands "PACKAGE..." COMMAND...   installs the packages where a command is missing
 
 CACHE=${QX_CACHE:-${XDG_CACHE_HOME:-${HOME:-/root}/.cache}/qxanalysis}
-mkdir -p "$CACHE"
 
 told=$SECONDS # when something was last written
 note() {
@@ -20,6 +21,8 @@ fail() {
     note "$*"
     exit 1
 }
+
+made=$(mkdir -p "$CACHE" 2>&1) || fail "there is no cache (${made#mkdir: }): QX_CACHE names another folder"
 
 # How far a command is, from the end of its log: [12/345] of a build, 12/34 of the tests, what apt is
 # at, or what a set-up script says.
@@ -115,13 +118,26 @@ install_packages() {
 # One script at a time works on a thing of the cache: two builds may be configured at once. The lock
 # is held until the script ends, or another file descriptor than 9 is closed.
 lock_cache() {
-    local name=$1 descriptor=${2:-9}
-    eval "exec $descriptor>\"\$CACHE/\$name.lock\""
+    [ -w "$CACHE" ] || fail "the cache $CACHE cannot be written to: QX_CACHE names another folder"
+    lock_file "$CACHE/$1.lock" "${2:-9}"
+}
+
+lock_file() {
+    local file=$1 descriptor=${2:-9}
+    eval "exec $descriptor>\"\$file\""
     flock -n "$descriptor" && return
-    note "waiting for another script, which has $CACHE/$name.lock"
+    note "waiting for another script, which has $file"
     until flock -w 9 "$descriptor"; do
         note "still waiting"
     done
+}
+
+# A build goes by the times of files. After a clock that was ahead it would run cmake again and again, or take for
+# new what is old.
+check_clock() {
+    local late
+    late=$(cd "$1" && find CMakeLists.txt cmake include src host build/release -newermt '1 minute' -print -quit 2>/dev/null) || true
+    [ -z "$late" ] || fail "$1/$late is from the future: if the clock is right now, touch the file, or remove build/release"
 }
 
 need_commands() {

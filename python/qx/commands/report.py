@@ -26,6 +26,8 @@ def report_on(options):
     reading = reading_options.of(options)
     if many.is_many(options.files):
         return report_on_many(options, reading)
+    from .. import isolation
+    isolation.prepare()  # while this process loads what comes after reading
     import tqdm
 
     from .. import outputs, recording, report
@@ -43,6 +45,7 @@ def report_on_many(options, reading):
     import tqdm
 
     from .. import many
+    from ..files import printable
     bar = tqdm.tqdm(unit=" recordings", disable=not sys.stderr.isatty())
 
     def tell(outcome):
@@ -61,7 +64,7 @@ def report_on_many(options, reading):
     read = sum(not outcome.failure for outcome in found)
     print(f"{read} of {len(found)} recordings were read: {os.path.join(options.output, 'index.html')}")
     if left := many.left_out(options.files):
-        print(f"left out by their endings: {', '.join(left[:LISTED])}"
+        print(f"left out by their endings: {printable(', '.join(left[:LISTED]))}"
               + f" and {len(left) - LISTED} more, which the index lists" * (len(left) > LISTED))
     if not read:
         raise many.InputError("no recording could be read")

@@ -28,17 +28,16 @@ def rate(text):
 def resample(options):
     import tqdm
 
-    from .. import audio, outputs
-    from ..resampling import opened, resample_file
+    from .. import outputs
+    from ..resampling import resample_file
     outputs.check(options.target, options.force, inputs=outputs.identities([options.source]))
-    with opened(options.source) as source:
-        # A file that is done within a second needs no bar.
-        with tqdm.tqdm(total=source.frames, unit=" frames", unit_scale=True, delay=1, leave=False,
-                       disable=not sys.stderr.isatty()) as bar:
-            done = resample_file(source, options.target, options.rate, bar.update)
-        print(f"{options.source}: {done.read} frames at {source.samplerate} Hz")
-    if wrong := audio.wrong_length(options.source, done.read):
-        print(f"qx: {options.source}: {wrong}", file=sys.stderr)
+    # A file that is done within a second needs no bar.
+    with tqdm.tqdm(unit=" frames", unit_scale=True, delay=1, leave=False, disable=not sys.stderr.isatty()) as bar:
+        done = resample_file(options.source, options.target, options.rate, bar.update,
+                             lambda sound: bar.reset(sound.frames))
+    print(f"{options.source}: {done.read} frames at {done.sound.samplerate} Hz")
+    if done.wrong:
+        print(f"qx: {options.source}: {done.wrong}", file=sys.stderr)
     written = -(-done.read * done.up // done.down)
     print(f"{options.target}: {written} frames at {options.rate} Hz{done.format_note}")
     if done.clipped:

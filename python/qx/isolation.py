@@ -1,0 +1,302 @@
+"""Files are read in a process of its own, with limits: where a library crashes, hangs or takes all memory over a
+file, that file is refused with one line, and the process of the user goes on.
+
+    result = read(function, path, *arguments, told=progress)
+
+calls function(tell, path, file, *arguments) in a worker: `file` is where the contents are, `path` what messages
+name, and what the function gives to `tell` is given to `told` here. What it raises is raised here. A worker is kept
+for the next file, since its start takes about 0.2 s. Results come as qx/messages.py has it, without a copy.
+
+The limits keep faults and floods away and are no sandbox: a worker has the rights of the user.
+"""
+
+import atexit
+import contextlib
+import os
+import pickle
+import shutil
+import signal
+import socket
+import stat
+import subprocess
+import sys
+import tempfile
+import threading
+import traceback
+from typing import NamedTuple
+
+from .files import PIPE, InputError
+
+SECONDS, SECONDS_A_BYTE = 8, 1e-5  # of processor time
+MEMORY, MEMORY_A_BYTE = 1 << 30, 4
+WRITTEN, WRITTEN_A_BYTE = 1 << 30, 64  # of each temporary file
+ALLOWED_SECONDS, ALLOWED_MEMORY = "QX_READ_SECONDS", "QX_READ_MB"  # in the environment, in place of these
+STILL = 30  # seconds without any processor time after which a worker counts as hanging
+KEPT = 400 << 20  # bytes; a worker that has had more is not kept for the next file
+START = "import sys; sys.path[:] = {!r}; from qx.isolation import serve; serve({}, {})"
+AVAILABLE = sys.platform == "linux" and bool(sys.executable)  # elsewhere files are read in the user's process
+
+
+class Limits(NamedTuple):
+    seconds: int
+    memory: int
+    written: int
+
+
+def limits_for(size):
+    """The limits for a file of `size` bytes."""
+    seconds, memory = os.environ.get(ALLOWED_SECONDS), os.environ.get(ALLOWED_MEMORY)
+    return Limits(int(float(seconds)) if seconds else int(SECONDS + SECONDS_A_BYTE * size),
+                  int(float(memory) * 1e6) if memory else MEMORY + MEMORY_A_BYTE * size,
+                  WRITTEN + WRITTEN_A_BYTE * size)
+
+
+class Died(Exception):
+    """A worker has ended, or was ended, without an answer."""
+
+
+class Worker:
+    """A process that reads one file after another. It ends with this one, in whatever way this one ends."""
+
+    def __init__(self):
+        from .messages import Channel
+        self.files, self.owner = 0, os.getpid()
+        ours, theirs = socket.socketpair()
+        watched, self._held = os.pipe()
+        ends = (theirs.fileno(), watched)
+        with theirs:
+            self.process = subprocess.Popen(
+                [sys.executable, *(f"-W{option}" for option in sys.warnoptions), "-c",
+                 START.format(sys.path, *ends)], pass_fds=ends, stdin=subprocess.DEVNULL, stdout=subprocess.DEVNULL,
+                stderr=None if os.environ.get("QX_TRACEBACK") else subprocess.DEVNULL,
+                env={**os.environ, "OPENBLAS_NUM_THREADS": "1", "MALLOC_ARENA_MAX": "2"})
+        os.close(watched)
+        ours.settimeout(1)
+        self._socket, self._channel = ours, Channel(ours)
+
+    def close(self):
+        os.close(self._held)
+        self._socket.close()
+        if self.owner == os.getpid():  # and no child of it, which has a copy
+            self.process.kill()
+            self.process.wait()
+
+    def run(self, limits, folder, function, arguments, options, told):
+        """The result of function(tell, *arguments, **options), and whether the worker is good for more."""
+        self.files += 1
+        try:
+            self._channel.send((limits, folder, _current(), function, arguments, options))
+            while True:
+                kind, value, reusable = self._answer()
+                if kind == "told":
+                    told(value)
+                else:
+                    return kind, value, reusable
+        except (EOFError, ConnectionError):
+            raise Died(self._reason(limits)) from None
+
+    def _answer(self):
+        still, before = 0, None
+        while True:
+            try:
+                return self._channel.receive()
+            except TimeoutError:
+                used = self._processor_time()
+                still, before = still + 1 if used == before else 0, used
+                if still >= STILL:
+                    raise Died(f"its reader has done nothing for {STILL} s and was ended") from None
+
+    def _processor_time(self):
+        with contextlib.suppress(OSError), open(f"/proc/{self.process.pid}/stat") as file:
+            return file.read().rpartition(")")[2].split()[11:13]
+
+    def _reason(self, limits):
+        code = self.process.wait()
+        if code == -signal.SIGXCPU:
+            return f"reading takes more than {limits.seconds} s of processor time; {ALLOWED_SECONDS} allows more"
+        if code < 0:
+            name = signal.Signals(-code).name
+            return f"its reader {'was ended, perhaps for want of memory' if code == -9 else 'crashed'} ({name})"
+        return f"its reader ended with {code}"
+
+
+_idle: list = []  # workers
+_lock = threading.Lock()
+
+
+def _take():
+    with _lock:
+        return _idle.pop() if _idle else Worker()
+
+
+def _keep(worker):
+    with _lock:
+        if not _idle and worker.owner == os.getpid():
+            _idle.append(worker)
+            return
+    worker.close()
+
+
+def prepare():
+    """Starts a worker, which is ready by the time a file is to be read."""
+    if AVAILABLE and not _idle:
+        _keep(Worker())
+
+
+@atexit.register
+def close():
+    """Ends the workers that wait."""
+    while _idle:
+        _idle.pop().close()
+
+
+if hasattr(os, "register_at_fork"):
+    os.register_at_fork(after_in_child=close)
+
+
+def read(function, path, *arguments, told=lambda value: None, **options):
+    """The result of function(tell, path, file, *arguments, **options)."""
+    path = os.fspath(path)
+    with _folder() as folder:
+        path, file = _named(path, folder)
+        if not AVAILABLE:
+            return function(told, path, file, *arguments, **options)
+        size = os.path.getsize(file) if os.path.isfile(file) else 0
+        limits = limits_for(size)
+        try:
+            return _isolated(limits, folder, function, (path, file, *arguments), options, told)
+        except MemoryError:
+            raise InputError(f"{path}: reading takes more than {limits.memory / 1e6:.0f} MB of memory; "
+                             f"{ALLOWED_MEMORY} allows more") from None
+        except Died as reason:
+            raise InputError(f"{path}: cannot be read: {reason}") from None
+
+
+def _isolated(limits, folder, function, arguments, options, told):
+    heard = []
+
+    def tell(value):
+        heard[:] = [True]
+        told(value)
+
+    while True:
+        worker, reusable = _take(), False
+        try:
+            kind, value, reusable = worker.run(limits, folder, function, arguments, options, tell)
+        except Died:
+            if worker.files == 1 or heard:
+                raise
+            continue  # what an earlier file has left behind may be the reason
+        finally:
+            _keep(worker) if reusable else worker.close()
+        if kind == "failed":
+            raise value
+        return value
+
+
+@contextlib.contextmanager
+def _folder():
+    """A folder for temporary files, which goes in whatever way the worker ends; None where there can be none."""
+    try:
+        folder = tempfile.mkdtemp(prefix="qx-")
+    except OSError:
+        yield None
+        return
+    try:
+        yield folder
+    finally:
+        shutil.rmtree(folder, ignore_errors=True)
+
+
+def _named(path, folder):
+    """How messages name the input, and where its contents are: standard input and pipes go through a file."""
+    if path == PIPE:
+        return "standard input", _spooled("standard input", sys.stdin.buffer, folder)
+    with contextlib.suppress(OSError):
+        if stat.S_ISFIFO(os.stat(path).st_mode):
+            with open(path, "rb") as stream:
+                return path, _spooled(path, stream, folder)
+    return path, path
+
+
+def _spooled(name, stream, folder):
+    try:
+        handle, path = tempfile.mkstemp(dir=folder)
+        with open(handle, "wb") as file:
+            shutil.copyfileobj(stream, file, 1 << 20)
+    except OSError as error:
+        raise InputError(f"{name}: cannot be kept in {folder or 'a temporary folder'}: "
+                         f"{error.strerror or error}") from None
+    return path
+
+
+def _current():
+    with contextlib.suppress(OSError):
+        return os.getcwd()
+    return None
+
+
+# In the worker.
+
+def serve(descriptor, watched):
+    """Reads files for the process that holds the other ends, and ends with it."""
+    import fcntl
+    import resource
+
+    from .messages import Channel
+    signal.signal(signal.SIGINT, signal.SIG_IGN)  # a terminal sends it to all; the other process decides
+    signal.signal(signal.SIGIO, signal.SIG_DFL)
+    signal.pthread_sigmask(signal.SIG_SETMASK, ())
+    fcntl.fcntl(watched, fcntl.F_SETOWN, os.getpid())
+    fcntl.fcntl(watched, fcntl.F_SETFL, os.O_ASYNC)  # SIGIO when it is closed, whatever a library is at
+    resource.setrlimit(resource.RLIMIT_CORE, (0, 0))
+    channel = Channel(socket.socket(fileno=descriptor))
+    with contextlib.suppress(EOFError, ConnectionError):
+        while True:
+            limits, folder, current, function, arguments, options = channel.receive()
+            tempfile.tempdir = folder
+            if current:
+                with contextlib.suppress(OSError):
+                    os.chdir(current)
+            _limit(limits)
+            try:
+                answer = "done", function(lambda value: channel.send(("told", value, True)), *arguments, **options)
+            except ConnectionError:
+                raise
+            except Exception as error:
+                if os.environ.get("QX_TRACEBACK"):
+                    traceback.print_exc()
+                answer = "failed", _sendable(error, arguments[0])
+            _send(channel, answer)
+            del answer, function, arguments, options
+
+
+def _send(channel, answer):
+    import resource
+    most = resource.getrusage(resource.RUSAGE_SELF).ru_maxrss << 10
+    reusable = most < KEPT
+    try:
+        channel.send((*answer, reusable))
+    except MemoryError as error:
+        channel.send(("failed", error, False))
+
+
+def _sendable(error, path):
+    """The exception, or a plain one where the other process could not make it anew."""
+    try:
+        return pickle.loads(pickle.dumps(error))
+    except Exception:
+        return InputError(f"{path}: {type(error).__name__}: {error}")
+
+
+def _limit(limits):
+    import resource
+    usage = resource.getrusage(resource.RUSAGE_SELF)
+    used = int(usage.ru_utime + usage.ru_stime) + 1
+    with open("/proc/self/statm") as file:
+        reserved, resident = (int(pages) * resource.getpagesize() for pages in file.read().split()[:2])
+    for what, most in ((resource.RLIMIT_CPU, used + limits.seconds),
+                       (resource.RLIMIT_AS, reserved - resident + limits.memory),
+                       (resource.RLIMIT_FSIZE, limits.written)):
+        hard = resource.getrlimit(what)[1]
+        resource.setrlimit(what, (most if hard == resource.RLIM_INFINITY else min(most, hard), hard))

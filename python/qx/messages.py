@@ -1,0 +1,111 @@
+"""Messages between two processes of this machine: what pickle takes, with arrays in shared memory, which is mapped
+and not copied, and open files as their descriptors."""
+
+import array
+import contextlib
+import io
+import mmap
+import os
+import pickle
+import socket
+import struct
+
+IN_LINE = 1 << 16  # bytes of arrays for which shared memory is not worth the while
+HEAD = struct.Struct("<QII?")  # bytes of the pickle, arrays, open files, whether the arrays are in shared memory
+MOST_FILES = 250  # that a message of the system may carry
+
+
+class _Pickler(pickle.Pickler):
+    def __init__(self, file):
+        self.buffers, self.descriptors = [], []
+        super().__init__(file, 5, buffer_callback=lambda buffer: self.buffers.append(buffer.raw()))
+
+    def persistent_id(self, value):
+        if not isinstance(value, io.BufferedRandom):  # what tempfile.TemporaryFile gives
+            return None
+        value.flush()
+        self.descriptors.append(value.fileno())
+        return len(self.descriptors) - 1
+
+
+class _Unpickler(pickle.Unpickler):
+    def __init__(self, file, buffers, descriptors):
+        self.descriptors = descriptors
+        super().__init__(file, buffers=buffers)
+
+    def persistent_load(self, index):
+        return os.fdopen(self.descriptors[index], "r+b")
+
+
+class Channel:
+    """One end of a pair of sockets."""
+
+    def __init__(self, connection):
+        self.connection = connection
+
+    def send(self, value):
+        text = io.BytesIO()
+        pickler = _Pickler(text)
+        pickler.dump(value)
+        lengths = [len(buffer) for buffer in pickler.buffers]
+        shared = sum(lengths) >= IN_LINE
+        head = HEAD.pack(text.tell(), len(lengths), len(pickler.descriptors), shared)
+        with contextlib.ExitStack() as stack:
+            descriptors = pickler.descriptors
+            if shared:
+                descriptors = [*descriptors, stack.enter_context(_in_memory(pickler.buffers)).fileno()]
+            socket.send_fds(self.connection, [head[:1]], descriptors)
+            self.connection.sendall(head[1:] + array.array("Q", lengths).tobytes())
+            self.connection.sendall(text.getbuffer())
+            for buffer in () if shared else pickler.buffers:
+                self.connection.sendall(buffer)
+
+    def receive(self):
+        """The next message. EOFError where the other side has ended; TimeoutError, where the connection has a
+        timeout, only before the first byte of a message."""
+        first, descriptors, _, _ = socket.recv_fds(self.connection, 1, MOST_FILES)
+        if not first:
+            raise EOFError
+        before = self.connection.gettimeout()
+        self.connection.settimeout(None)
+        try:
+            size, count, files, shared = HEAD.unpack(first + self._exactly(HEAD.size - 1))
+            lengths = array.array("Q", bytes(self._exactly(8 * count)))
+            text = self._exactly(size)
+            total = sum(lengths)
+            store = _mapped(descriptors[files], total) if shared else self._exactly(total)
+        finally:
+            self.connection.settimeout(before)
+        buffers, start = [], 0
+        for length in lengths:
+            buffers.append(memoryview(store)[start:start + length])
+            start += length
+        return _Unpickler(io.BytesIO(text), buffers, descriptors).load()
+
+    def _exactly(self, size):
+        found = bytearray(size)
+        rest = memoryview(found)
+        while rest:
+            count = self.connection.recv_into(rest)
+            if not count:
+                raise EOFError
+            rest = rest[count:]
+        return found
+
+
+def _in_memory(buffers):
+    """An open file without a place on a disk that holds the buffers."""
+    file = os.fdopen(os.memfd_create("qx"), "wb", buffering=0)
+    for buffer in buffers:
+        rest = memoryview(buffer)
+        while rest:
+            rest = rest[file.write(rest):]
+    return file
+
+
+def _mapped(descriptor, size):
+    """The bytes of such a file, which belong to this process alone once it writes to them."""
+    try:
+        return mmap.mmap(descriptor, size, mmap.MAP_PRIVATE)
+    finally:
+        os.close(descriptor)
