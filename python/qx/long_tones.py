@@ -6,7 +6,7 @@ import math
 
 import numpy as np
 
-from . import tones, windows
+from . import measure, tones, windows
 from .outcomes import QxError
 from .wholes import AveragedSpectrum
 
@@ -17,6 +17,7 @@ BLOCK = 1 << 18  # samples, of which a transform takes the bands
 MOST_KEPT = 1 << 18  # samples of a band, where it becomes no narrower than NARROWEST lines of a block
 NARROWEST = 512
 WINDOW = "blackman_harris7"
+DECIBELS_OF_BIT = 20 * math.log10(2)
 
 
 def strongest(whole, rate, count=5):
@@ -149,3 +150,24 @@ def residual_rms(whole, found, rate):
         total += float(rest @ rest)
         seen += len(part)
     return math.sqrt(total / whole.count)
+
+
+def harmonics(whole, rate, fundamental, count, full_scale=None):
+    """measure.harmonics by the means of the powers over parts of SEGMENT samples; phases are those of the first
+    part, and a bin is one of a part. A QxError where a part has no such tone."""
+    parts = [measure.harmonics(part, rate, fundamental, count, full_scale) for part in whole.parts(SEGMENT)
+             if len(part) == SEGMENT]
+    powers = np.array([one.amplitudes**2 for one in parts])
+    mean = powers.mean(0)
+
+    def beside(name, sign=1):
+        """The fundamental over what is so many decibels below it, or above with the other sign."""
+        return sign * 10 * math.log10(mean[0] / np.mean([own[0] / 10**(sign * getattr(one, name) / 10)
+                                                         for one, own in zip(parts, powers)]))
+
+    sinad = beside("sinad")
+    bits = np.mean([one.enob - one.sinad / DECIBELS_OF_BIT for one in parts]) + sinad / DECIBELS_OF_BIT
+    return dataclasses.replace(
+        parts[0], amplitudes=np.sqrt(mean), sinad=sinad, snr=beside("snr"), sfdr=beside("sfdr"), enob=float(bits),
+        thd=math.sqrt(np.mean([one.thd**2 * own[0] for one, own in zip(parts, powers)]) / mean[0]),
+        noise_floor=beside("noise_floor", -1))

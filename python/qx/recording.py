@@ -328,7 +328,7 @@ def _without_holes(path, values, seconds, holes, missing):
         raise InputError(f"{path}: no value is left without the missing ones")
     missed = f"{count} missing value{'s' * (count > 1)} "
     if missing == "skip":
-        return values[~holes], None if seconds is None else seconds[~holes], missed + "left out"
+        return values[~holes], seconds, missed + "left out, behind which the others close up"
     at = np.arange(len(values)) if seconds is None else seconds
     values = values.copy()
     values[holes] = np.interp(at[holes], at[~holes], values[~holes])

@@ -88,10 +88,9 @@ def spectrum(values, rate=1.0, window=WINDOW):
     return found.frequencies, scale * amplitudes, found.resolution
 
 
-def plot(recording, found, analysis):
-    """The spectrum in dB of the largest tone, with the tones and the harmonics."""
-    scale, _ = frequency_axis(recording)
-    frequencies, amplitudes, resolution = spectrum(recording.values, scale)
+def plot(recording, found, analysis, drawn):
+    """The spectrum in dB of the largest tone, with the tones and the harmonics; `drawn` is what `spectrum` returns."""
+    frequencies, amplitudes, resolution = drawn
     largest = found.amplitudes[0]
 
     def decibels(amplitudes):
