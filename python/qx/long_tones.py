@@ -141,15 +141,16 @@ def _in_band(whole, band, centre, count):
 
 
 def residual_rms(whole, found, rate):
-    """The root mean square of what the tones leave."""
-    total, seen = 0.0, 0
+    """The root mean square of what the tones and a constant leave."""
+    total, squares, seen = 0.0, 0.0, 0
     for part in whole.parts():
         t, rest = np.arange(len(part)), part - whole.moments.mean
         for f, a, phase in zip(found.frequencies / rate, found.amplitudes, found.phases):
             rest -= a * np.cos(2 * math.pi * (f * t + math.fmod(f * seen, 1.0)) + phase)
-        total += float(rest @ rest)
+        total += float(rest.sum())
+        squares += float(rest @ rest)
         seen += len(part)
-    return math.sqrt(total / whole.count)
+    return math.sqrt(max(0.0, squares - total * total / seen) / seen)
 
 
 def harmonics(whole, rate, fundamental, count, full_scale=None):

@@ -33,7 +33,8 @@ class Recording:
     notes: list  # comment lines of the file
     choice: str = ""  # what was taken from the file, and why
     whole: object = None  # all samples (Whole) where the values are the first of them only
-    envelope: object = None  # the outline of all samples (Envelope)
+    envelope: object = None  # the outline of all samples (Envelope), with gaps where values are left out
+    row_rate: float | None = None  # of the outlines, where it may be another than that of the values
     others: list = dataclasses.field(default_factory=list)  # the other channels (Channel)
 
     def times(self):
@@ -130,7 +131,7 @@ def _of_audio(source, column, start, outline, progress):
     if wrong := audio.wrong_length(path, frames):
         choice += f"; {wrong}"
     return Recording(source.name, values, rate or None, "from the header of the file", "FS",
-                     f"channel {channel} of {channels}", [], choice, _if_longer(whole), whole.envelope, shown)
+                     f"channel {channel} of {channels}", [], choice, _if_longer(whole), whole.envelope, others=shown)
 
 
 def _if_longer(whole):
@@ -164,8 +165,10 @@ def _of_table(reader, column, time, missing, start, rate, habit, outline, progre
     values, seconds, said = _columns(reader, chosen, time, start, outlines, whole)
     if not len(values):
         raise InputError(f"{path}: has no value from sample {start + 1} on")
-    count, holes = len(values), np.isnan(values)
+    count, holes, row_rate = len(values), np.isnan(values), None
     if holes.any():
+        if missing == "skip" and time is not None:
+            row_rate, _ = _rate(reader, seconds, time, habit)
         values, seconds, treated = _without_holes(path, values, seconds, holes, missing)
         said.append(treated)
     source = ""
@@ -179,7 +182,7 @@ def _of_table(reader, column, time, missing, start, rate, habit, outline, progre
         name, its_unit = _label(layout, c, reader.notes)
         shown.append(Channel(name, its_unit, one))
     return Recording(reader.name, values, rate, source, unit, label, reader.notes, choice,
-                     _if_longer(whole), whole.envelope, shown)
+                     _if_longer(whole), whole.envelope, row_rate, shown)
 
 
 def _refuse_wrapped(reader, column):
@@ -328,7 +331,7 @@ def _without_holes(path, values, seconds, holes, missing):
         raise InputError(f"{path}: no value is left without the missing ones")
     missed = f"{count} missing value{'s' * (count > 1)} "
     if missing == "skip":
-        return values[~holes], seconds, missed + "left out, behind which the others close up"
+        return values[~holes], None if seconds is None else seconds[~holes], missed + "left out"
     at = np.arange(len(values)) if seconds is None else seconds
     values = values.copy()
     values[holes] = np.interp(at[holes], at[~holes], values[~holes])

@@ -1,6 +1,7 @@
 """The section of the report that takes mains hum and baseline wander out of a recording that has them, with
 filters designed for its rate."""
 
+import contextlib
 import dataclasses
 
 import numpy as np
@@ -42,13 +43,11 @@ def line_at(recording, frequency, spectrum):
     line = lines[away <= NOTCH].max(initial=0.0)
     around = lines[(away > NOTCH) & (away <= 5 * NOTCH)]
     floor = np.median(around) if len(around) else 0.0
-    if not floor > 0:
-        return line, 0.0
-    try:
-        line_ = measure.tone(recording.values, recording.rate, frequency, NOTCH).amplitude
-    except QxError:
-        line_ = line
-    return line_, line / floor
+    if not line > STANDS_OUT * floor > 0:  # the tone behind the line is of no interest
+        return line, line / floor if floor > 0 else 0.0
+    with contextlib.suppress(QxError):
+        return measure.tone(recording.values, recording.rate, frequency, NOTCH).amplitude, line / floor
+    return line, line / floor
 
 
 def hum_of(recording):

@@ -1,5 +1,6 @@
 """Sections of the report: the recording, its statistics, its histogram."""
 
+import dataclasses
 import math
 
 import numpy as np
@@ -24,7 +25,9 @@ def over_time(recording, title, **more):
 def outline(recording, title, channel=None):
     """The whole of a recording, or of another of its channels, that may be longer than what is kept."""
     channel = channel or recording
-    plot = over_time(recording, title)
+    of_rows = dataclasses.replace(recording, rate=recording.row_rate or recording.rate)
+    plot = over_time(of_rows, title)
+    plot.link = TIME if of_rows.rate == recording.rate else "rows"
     plot.y_label = quantity(channel)
     if channel is recording and (channel.envelope is None or channel.envelope.count == len(recording.values)):
         plot.curves = [figures.Curve(channel.channel, channel.values)]
@@ -61,7 +64,7 @@ def overview(recording):
 
 def statistics(recording):
     x, whole, unit = recording.values, recording.whole, recording.unit
-    bins = bins_for(count_of(recording))
+    bins = 120 if whole else bins_for(len(x))
     if whole:
         counts, centres = whole.histogram(bins)
         moments = {order: whole.moments.moment(order) for order in (2, 3, 4)}

@@ -115,7 +115,8 @@ class Opened:
         channels += [(other.channel, other.unit, other.envelope) for other in read.others]
         for *_, levels in channels:
             levels.finish()
-        self.recording, self.channels = dataclasses.replace(read, others=[], whole=None, envelope=None), channels
+        self.recording, self.channels = dataclasses.replace(
+            read, rate=read.row_rate or read.rate, others=[], whole=None, envelope=None), channels
 
     def plots(self):
         """The plots of the channels, whose samples are asked for as they are needed."""

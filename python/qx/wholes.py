@@ -15,28 +15,36 @@ SELECTED = 1 << 22  # samples among which a rank is found by sorting
 
 
 class Moments:
-    """Count, mean, sums of powers of the differences from it, and extremes, part by part. Parts are joined by the
+    """Count, mean, sums of powers of the differences from it, and extremes, part by part. The first value is taken
+    from all, so that nothing is lost of a small spread far from zero. Parts are joined by the
     formulas of P. Pébay, "Formulas for robust, one-pass parallel computation of covariances and arbitrary-order
     statistical moments", 2008."""
 
     def __init__(self):
-        self.count, self.mean, self.sums = 0, np.float64(0), np.zeros(3)
+        self.count, self.sums = 0, np.zeros(3)
+        self._first, self._mean = None, np.float64(0)
         self.least, self.greatest = np.inf, -np.inf
 
     def add(self, values):
+        self.least, self.greatest = min(self.least, float(values.min())), max(self.greatest, float(values.max()))
+        self._first = values[0] if self._first is None else self._first
+        values = values - self._first
         a, b, n = self.count, len(values), self.count + len(values)
         mean = np.float64(stats.mean(values))
         mine, theirs = self.sums, np.array([b * stats.moment(values, order) for order in (2, 3, 4)])
         with np.errstate(over="ignore", invalid="ignore"):
-            d, p, q = mean - self.mean, a / n, b / n
+            d, p, q = mean - self._mean, a / n, b / n
             self.sums = mine + theirs + np.array([
                 d**2 * a * q,
                 d**3 * a * q * (p - q) + 3 * d * (p * theirs[0] - q * mine[0]),
                 d**4 * a * q * (p * p - p * q + q * q) + 6 * d**2 * (p * p * theirs[0] + q * q * mine[0])
                 + 4 * d * (p * theirs[1] - q * mine[1])])
-            self.mean = self.mean + d * q
+            self._mean = self._mean + d * q
         self.count = n
-        self.least, self.greatest = min(self.least, float(values.min())), max(self.greatest, float(values.max()))
+
+    @property
+    def mean(self):
+        return float(self._first + self._mean)
 
     def moment(self, order):
         """The central moment of order 2, 3 or 4."""
@@ -148,8 +156,9 @@ class Whole:
         self._file.seek(8 * first)
         return np.fromfile(self._file, float, min(count, self.count - first))
 
-    def parts(self, hop=BLOCK, length=None):
+    def parts(self, hop=None, length=None):
         """Blocks that begin `hop` samples apart, and are longer where `length` says so."""
+        hop = hop or BLOCK
         for first in range(0, self.count, hop):
             found = self.part(first, length or hop)
             self._progress(min(hop, len(found)))
@@ -208,5 +217,5 @@ class Whole:
 def _places(values, low, high):
     """The bins of values, of FINE between two limits; the last one has the upper limit."""
     if not low < high:
-        return np.zeros(len(values), np.int64)
+        return np.full(len(values), FINE - 1)
     return np.minimum((values - low) * (FINE / (high - low)), FINE - 1).astype(np.int64)

@@ -131,6 +131,21 @@ class Server(InFolder):
             if highs is not None:
                 np.testing.assert_array_equal(highs, np.maximum.reduceat(x[:start + group * len(lows)], starts))
 
+    def test_missing_values_are_gaps_at_their_times(self):
+        path = self.folder / "gaps.csv"
+        path.write_text("time (s),u\n" + "".join(f"{i / 100},{'' if i % 7 == 3 or 500 <= i < 700 else i % 5}\n"
+                                                 for i in range(2000)))
+        served = self.served(path, missing="skip")
+        _, found = served.ask("sections", **{"from": 8, "to": 15})
+        self.assertIn("from 8 to 15 s", found["html"])
+        self.assertIn("missing values are left out of statistics and histogram", found["html"])
+        image = next(plot["image"] for plot in found["plots"] if "image" in plot)
+        self.assertAlmostEqual(image["right"], 15, delta=0.02)
+        levels = served.opened[0].channels[0][2]
+        np.testing.assert_array_equal(np.isnan(levels.values), [i % 7 == 3 or 500 <= i < 700 for i in range(2000)])
+        seen = served.ask("data", version=1, **{"from": 0, "to": 20, "points": 5000})[1]
+        self.assertAlmostEqual(seen["step"], 0.01)
+
     def test_sections_are_those_of_the_part_the_channel_and_the_filter(self):
         t = np.arange(20_000) / 1000
         both = np.stack([t, np.sin(2 * np.pi * 50.5 * t) + np.sin(2 * np.pi * 200 * t), np.where(t < 5, 1, 3.0)], -1)
