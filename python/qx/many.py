@@ -183,7 +183,7 @@ def index(found, left=()):
              f"<tbody>{rows}</tbody></table></div>"
              + (f"<h2>Not read</h2><ul>{failed}</ul>" if failed else "")
              + (f"<h2>Left out by their endings</h2><ul>{others}</ul>" if others else ""))
-    return pages.page("report", "Recordings", inner, scripts=pages.own_script("index.js"))
+    return pages.page("report", "Recordings", inner, scripts=pages.own_script("index.js"), kind="index")
 
 
 def _link(name):

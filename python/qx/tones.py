@@ -99,7 +99,8 @@ def plot(recording, found, analysis, drawn):
     lines = decibels(amplitudes)
     bottom = min(decibels(found.amplitudes).min(), np.median(lines)) - 25
     seen = np.nan_to_num(analysis.amplitudes) > largest * 10**(bottom / 20)
-    marks = [figures.Mark(f, decibels(a), "", figures.BLUE) for f, a in zip(found.frequencies, found.amplitudes)]
+    marks = [figures.Mark(f, decibels(a), "", figures.BLUE) for f, a, is_tone in zip(
+        found.frequencies, found.amplitudes, found.significant) if is_tone]
     marks += [figures.Mark(analysis.frequencies[h], decibels(analysis.amplitudes[h]), str(h + 1))
               for h in np.flatnonzero(seen)]
     return figures.Plot(
