@@ -131,6 +131,35 @@ TEST(Blocks, StayWithinWhatIsReserved) {
     QXHostFree(array);
 }
 
+TEST(Calls, GoThroughTheElementsOfTheColumns) {
+    double x[] = {0.5, -2, 3}, y[] = {2, 3, 4}, sum[3] = {}, product[3] = {};
+    int32_t factor[] = {1, 2, 3};
+    ErrorCode codes[] = {7, 7, 7};
+    void *of_values[] = {x, factor, sum, product};
+    const auto scaled = +[](double v, int32_t k, double *twice, double *times) {
+        *twice = 2 * v;
+        *times = k * v;
+    };
+    EXPECT_EQ(QXHostCalls(reinterpret_cast<QXHostFunction>(scaled), "vdiDD", 3, of_values, codes),
+              QXHostDone);
+    void *of_pointers[] = {x, y};
+    const auto moved = +[](double *from, double *to) {
+        *to += *from;
+        return int32_t{*from < 0};
+    };
+    EXPECT_EQ(codes[1], 7);
+    EXPECT_EQ(QXHostCalls(reinterpret_cast<QXHostFunction>(moved), "eDD", 3, of_pointers, codes),
+              QXHostDone);
+    for (int i = 0; i < 3; ++i) {
+        EXPECT_EQ(sum[i], 2 * x[i]);
+        EXPECT_EQ(product[i], (i + 1) * x[i]);
+        EXPECT_EQ(y[i], 2 + i + x[i]);
+        EXPECT_EQ(codes[i], i == 1);
+    }
+    EXPECT_EQ(QXHostCalls(reinterpret_cast<QXHostFunction>(moved), "eD", 3, of_pointers, codes),
+              QXHostBadArgument);
+}
+
 TEST(Blocks, OfTwoDimensionsStartAtByteEight) {
     const double values[] = {1, 2, 3, 4, 5, 6};
     auto *array = static_cast<Array2DHandle>(QXHostCopy2D(QXTypeDBL, 2, 3, values));

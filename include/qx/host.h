@@ -83,18 +83,15 @@ QX_HOST_API int32_t QXHostReleaseObject(void *object);
 QX_HOST_API const char *QXHostErrorText(ErrorCode code);
 QX_HOST_API const char *QXHostErrorName(ErrorCode code);
 
-/* Calls an export of complex numbers for each of `count` elements, for interpreters, in which a
-   call takes longer than such a function: function(z + i, selector[i], result + i), with an order
-   before it in the second form. codes[i] is what call i returned. */
-typedef ErrorCode (*QXHostOfComplex)(const CDB *z, int32_t selector, CDB *result);
-typedef ErrorCode (*QXHostOfOrderAndComplex)(double order, const CDB *z, int32_t selector,
-                                             CDB *result);
-QX_HOST_API void QXHostCallsOfComplex(QXHostOfComplex function, int64_t count, const CDB *z,
-                                      const int32_t *selector, CDB *result, ErrorCode *codes);
-QX_HOST_API void QXHostCallsOfOrderAndComplex(QXHostOfOrderAndComplex function, int64_t count,
-                                              const double *order, const CDB *z,
-                                              const int32_t *selector, CDB *result,
-                                              ErrorCode *codes);
+/* Calls an export of numbers for each of `count` elements, for interpreters, in which a call takes
+   longer than such a function. `form` has a letter for what the export returns, v nothing, e an
+   int32_t, and one for each argument: d a double and i an int32_t, given by value; D, I and Z
+   pointers to a double, an int32_t and a complex number. columns[k] points to the `count` elements
+   of argument k, given or written; codes[i] is what call i returned, and stays as it is with v.
+   QXHostDone, or QXHostBadArgument for a form that no export has, without a call. */
+typedef void (*QXHostFunction)(void);
+QX_HOST_API int32_t QXHostCalls(QXHostFunction function, const char *form, int64_t count,
+                                void *const *columns, ErrorCode *codes);
 
 /* By this name a module is known as a host. */
 extern QX_HOST_API int32_t gQXRTVersion;

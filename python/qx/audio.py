@@ -24,7 +24,7 @@ def is_audio(path, start):
 
 def read(path, local, column, first, most, whole, outlines, outline):
     """Samples of one channel from a frame on, the rate, the channel from 1 and the numbers of
-    channels and frames. `whole` is given all of them; `outlines` those of the
+    channels and frames. `whole` is given all samples from `first` on; `outlines` those of the
     other channels by their indices, in what `outline` makes. `path` is what messages name, `local` the
     file."""
     import soundfile
@@ -57,7 +57,7 @@ def _channel(path, file, channel, first, most, whole, outlines, outline):
             raise InputError(f"{path}: sample {seen + wrong[0] + 1} is not a finite number")
         begin, end = max(0, first - seen), max(0, first + most - seen)
         kept.append(part[begin:max(begin, end)].copy())
-        whole.add(np.ascontiguousarray(part))
+        whole.add(np.ascontiguousarray(part[begin:]))
         for i, one in outlines.items():
             beside = parts[begin:, i]
             one.add(np.where(np.isfinite(beside), beside, np.nan))

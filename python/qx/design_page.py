@@ -12,6 +12,7 @@ POINTS = 4000
 FLOOR = -200.0  # dB
 AROUND = 4.0  # times the highest edge, up to which the axes go at first
 MOST_ZEROS = 300  # that are sought
+MOST_ROWS = 12  # of coefficients that are shown unfolded
 SHOWN = 40  # coefficients in the lines of C; more are left out
 
 
@@ -70,8 +71,8 @@ def described(design, rate):
     rows = [Row("Filter", size + (", " + design.note if design.note else ""), "", design.python),
             Row("Stable", "yes" if not filter_.is_iir or filter_.is_stable else "NO", "", "Filter.poles"),
             Row("Half power at", ", ".join(crossings) or "no frequency", unit, "Filter.response"),
-            Row("Least gain", number(round(float(decibels.min()), 6), 4), "dB", "Filter.response"),
-            Row("Greatest gain", number(round(float(decibels.max()), 6), 4), "dB", "Filter.response")]
+            Row("Least gain", number(round(float(decibels.min()), 6) + 0.0, 4), "dB", "Filter.response"),
+            Row("Greatest gain", number(round(float(decibels.max()), 6) + 0.0, 4), "dB", "Filter.response")]
     if len(delays):
         low, high = number(delays.min(), 4), number(delays.max(), 4)
         rows.append(Row("Group delay of what passes", low if low == high else f"{low} to {high}", delay_unit,
@@ -113,8 +114,10 @@ def _over_time(filter_, rate, factor, unit):
     settled = min(20_000, filter_._ringing() if filter_.is_iir else len(filter_.taps)) + 8
     impulse = filter_(np.r_[1.0, np.zeros(settled - 1)])
     step = filter_(np.ones(settled))
+    energy = np.cumsum(impulse[::-1]**2)[::-1]
+    first = int(np.count_nonzero(energy > 1e-4 * np.sum(impulse[1:]**2))) + 8  # what follows is too small to be seen
     return [figures.Plot(title, f"Time ({unit})", "Response", [figures.Curve("response", values)], step=factor,
-                         link="time") for title, values in (("Impulse response", impulse), ("Step response", step))]
+                         x_range=(0.0, factor * min(first, settled - 1)), link="time") for title, values in (("Impulse response", impulse), ("Step response", step))]
 
 
 def in_the_plane(filter_):
@@ -154,7 +157,8 @@ def coefficients(filter_):
     body = "".join(f"<tr><th>{i}</th>" + "".join(f'<td class="value">{value!r}</td>' for value in row) + "</tr>\n"
                    for i, row in enumerate(rows.tolist()))
     text = f"sos = {filter_.sos.tolist()!r}" if filter_.is_iir else f"h = {filter_.taps.tolist()!r}"
-    return (f'<details open><summary>As a table</summary><div class="wide"><table><tr>{head}</tr>{body}</table></div>'
+    is_short = len(rows) <= MOST_ROWS
+    return (f'<details{" open" * is_short}><summary>As a table</summary><div class="wide"><table><tr>{head}</tr>{body}</table></div>'
             f"</details><details><summary>As text</summary><pre>{html.escape(text)}</pre></details>")
 
 

@@ -41,7 +41,7 @@ def svg(plot):
     draw(axes, plot)
     drawings = [_drawn(plt, figure, "wide")]
     figure.set_size_inches(NARROW, 2.7)
-    axes.set_title(textwrap.fill(plot.title, 46), loc="left")
+    axes.set_title(textwrap.fill(plot.title, 46), pad=18 if axes.get_legend() else 6)
     longest = max((len(label.get_text()) for label in axes.get_xticklabels()), default=0)
     if longest > 5:
         axes.locator_params(axis="x", nbins=max(2, 40 // (longest + 2)))
@@ -62,7 +62,7 @@ def _drawn(plt, figure, kind):
 
 
 def draw(axes, plot):
-    """The plot on axes of matplotlib, with the legend beside the data where there is one."""
+    """The plot on axes of matplotlib, with the legend above the data where there is one."""
     plot = figures.reduced(plot, 6000)
     places = plot.places() if plot.curves else np.empty(0)
     if plot.image:
@@ -87,14 +87,16 @@ def draw(axes, plot):
         if mark.label:
             axes.annotate(mark.label, (mark.x, mark.y), xytext=(0, 5), textcoords="offset points", ha="center",
                           fontsize=7.5)
-    axes.set(title=plot.title, xlabel=plot.x_label, ylabel=plot.y_label)
+    has_legend = len(plot.curves) + len(plot.levels) + len(plot.verticals) > 1
+    axes.set_title(textwrap.fill(plot.title, 110), pad=18 if has_legend else 6)
+    axes.set(xlabel=plot.x_label, ylabel=plot.y_label)
     axes.margins(x=0.005)
     if plot.y_range and all(map(math.isfinite, plot.y_range)):
         axes.set_ylim(*plot.y_range)
     if plot.x_range:
         axes.set_xlim(*plot.x_range)
-    if len(plot.curves) + len(plot.levels) + len(plot.verticals) > 1:
-        axes.legend(frameon=False, fontsize=8, loc="upper left", bbox_to_anchor=(1.0, 1.0))
+    if has_legend:
+        axes.legend(frameon=False, fontsize=8, loc="lower right", bbox_to_anchor=(1.0, 1.0), ncols=3, borderaxespad=0.2)
 
 
 def save(plots, path, command, heights=None):

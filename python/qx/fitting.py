@@ -188,7 +188,7 @@ def plots(result):
     with np.errstate(all="ignore"):
         curve = found.predict(x[order])
     rest = np.argsort(columns.x, kind="stable")
-    return [figures.Plot("", columns.x_label, columns.y_label,
+    return [figures.Plot(f"Fit to {columns.y_label}", columns.x_label, columns.y_label,
                          [figures.Curve("data", data[order], figures.GREY, dots=True),
                           figures.Curve(found.formula, curve)], x=x[order]),
             figures.Plot("", columns.x_label, "residual",

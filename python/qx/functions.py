@@ -7,8 +7,10 @@ does not need.
 """
 
 import ctypes
+import functools
 import keyword
 import linecache
+import math
 import re
 import textwrap
 
@@ -340,56 +342,77 @@ def many(*values):
     return any(np.ndim(value) for value in values)
 
 
-# Functions whose calls over arrays the stand-in host makes, by what they return and take.
-LOOPS = {
-    ("ErrorCode", ("reference", "CDB"), ("value", "I32"), ("output", "CDB")): "QXHostCallsOfComplex",
-    ("ErrorCode", ("value", "DBL"), ("reference", "CDB"), ("value", "I32"), ("output", "CDB")):
-        "QXHostCallsOfOrderAndComplex",
-}
+SEVERAL = 1 << 15  # elements from which on a function is mapped by several threads
+LETTERS = {"DBL": "d", "I32": "i", "CDB": "z"}  # of arguments by value; upper ones are pointers
+
+
+def form_of(entry):
+    """What a function of numbers returns and takes, as QXHostCalls of the stand-in host has it."""
+    letters = [LETTERS.get(a["element"], "?") for a in entry["arguments"]]
+    return ("v" if entry["returns"] == "void" else "e") + "".join(
+        letter if a["kind"] == "value" else letter.upper() for letter, a in zip(letters, entry["arguments"]))
+
+
+@functools.cache
+def _of_columns(name):
+    """The form of an export, and of each argument: whether it is given, its type, whether it is a result, and what
+    messages call it."""
+    entry = library().entries[name]
+    return form_of(entry).encode(), [
+        (is_given(a), arrays.element_dtype(a["element"]), a["element"], a["kind"] == "error", f"{name}: {a['name']}")
+        for a in entry["arguments"]]
+
+
+def _spread(values, columns):
+    """The values in one shape, checked, each as consecutive elements of its type."""
+    checked, shape = [], None
+    for value, (_, dtype, element, _, place) in zip(values, (column for column in columns if column[0])):
+        if isinstance(value, (str, bytes)):
+            raise TypeError(f"{place}: a number is needed; {shown(value)} came")
+        is_single = type(value) is float and element == "DBL" or type(value) is int and (
+            element == "I32" and -2**31 <= value < 2**31)
+        if not is_single:
+            if type(value) is not np.ndarray or value.dtype != dtype:
+                value = arrays.kind(element, np.ndim(value)).checked(value, place)
+            if shape is None or value.shape != shape:
+                shape = value.shape if shape is None else np.broadcast_shapes(shape, value.shape)
+        checked.append((value, dtype, is_single))
+    return shape, [np.ascontiguousarray(value, dtype) if not is_single and value.shape == shape else
+                   np.full(shape, value, dtype) for value, dtype, is_single in checked]
 
 
 def mapped(entry, function, values):
     """A function of scalars over arrays, element by element, with NumPy's broadcasting. The
-    function writes straight into the elements of the result."""
-    given = [a for a in entry["arguments"] if is_given(a)]
-    checked = []
-    for value, a in zip(values, given):
-        place = f"{entry['name']}: {a['name']}"
-        if isinstance(value, (str, bytes)):
-            raise TypeError(f"{place}: a number is needed; {shown(value)} came")
-        checked.append(arrays.kind(a["element"], np.ndim(value)).checked(value, place))
-    spread = np.broadcast_arrays(*checked)
-    shape, n = spread[0].shape, spread[0].size
-    spread = iter(spread)
-    columns, kept, results, codes = [], [], [], None
-    loop = LOOPS.get((entry["returns"], *((a["kind"], a["element"]) for a in entry["arguments"])))
-    for argument in entry["arguments"]:
-        dtype = arrays.element_dtype(argument["element"])
-        if is_given(argument):
-            data = np.ascontiguousarray(next(spread), dtype).ravel()
-            if argument["kind"] == "value" and not loop:
-                columns.append(data.tolist())
-                continue
-        else:
-            data = np.zeros(n, dtype)
-        if argument["kind"] == "error":
-            codes = data
-        elif argument["direction"] == "out":
-            results.append(data.reshape(shape))
-        kept.append(data)  # only its address goes into the calls
-        start = data.ctypes.data
-        columns.append(range(start, start + n * dtype.itemsize, dtype.itemsize))
-    if loop:
-        codes = np.zeros(n, np.int32)
-        getattr(library().host, loop)(function, n, *(data.ctypes.data for data in kept), codes.ctypes.data)
+    function writes straight into the elements of the result, called by the stand-in host, in several threads
+    where there are many."""
+    form, columns = _of_columns(entry["name"])
+    shape, given = _spread(values, columns)
+    n, codes, results, all_, given = math.prod(shape), None, [], [], iter(given)
+    for is_input, dtype, _, is_code, _ in columns:
+        all_.append(next(given) if is_input else np.zeros(shape, dtype))
+        if is_code:
+            codes = all_[-1]
+        elif not is_input:
+            results.append(all_[-1])
+    found = np.zeros(n, np.int32)
+    steps = [(array.__array_interface__["data"][0], array.itemsize) for array in (*all_, found)]
+
+    def calls(first, last):
+        addresses = [start + first * size for start, size in steps]
+        if library().host.QXHostCalls(function, form, last - first, (ctypes.c_void_p * len(all_))(*addresses[:-1]),
+                                      addresses[-1]):
+            raise TypeError(f"{entry['name']} takes single numbers only: the stand-in host has no form {form}")
+
+    if n < SEVERAL:
+        calls(0, n)
     else:
-        found = [function(*row) for row in zip(*columns)]
-        if entry["returns"] == "ErrorCode":
-            codes = np.array(found, np.int32)
+        from .topical import axes
+        each = -(-n // (4 * axes.processors()))
+        axes.many(lambda first: calls(first, min(first + each, n)), range(0, n, each), n)
+    if entry["returns"] == "ErrorCode":
+        codes = found
     if codes is not None:
-        _tell_first(entry["name"], codes)
-    if gives_value(entry):
-        return np.array(found, None if n else float).reshape(shape)
+        _tell_first(entry["name"], codes.ravel())
     return results[0] if len(results) == 1 else tuple(results)
 
 

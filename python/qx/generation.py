@@ -1,50 +1,42 @@
 """Signals by name: waves, noises and patterns of a given number of samples."""
 
+import math
+
 import numpy as np
 
-from . import outputs
-from .calls import call
-
-STATE = {"s1": 0, "s2": 0, "s3": 0}  # every seed restarts the stream
+from . import noise, outputs, signals
 
 
-def _wave(export, *after):
-    """A continuous wave; `after` names the options behind the phase."""
-    def generate(n, o):
-        return call(export, n, o.amplitude, o.frequency / o.rate, o.phase,
-                    *(getattr(o, name) for name in after))[0]
-    return generate
+def _wave(make, *more):
+    """A continuous wave; `more` are functions of the options for what follows the phase."""
+    return lambda n, o: make(n, o.frequency, o.rate, o.amplitude, math.radians(o.phase), *(one(o) for one in more))
 
 
-def _pulse(o, n, export, *arguments):
-    return call(export, np.empty(0), n, *arguments)
+def _times(n, o):
+    """The times of a pulse, from its own."""
+    return np.arange(n) / o.rate - o.delay
 
 
 SIGNALS = {
-    "sine": _wave("SineWaveCIN"),
-    "square": _wave("SquareWaveCIN", "duty"),
-    "triangle": _wave("TriangleWaveCIN"),
-    "sawtooth": _wave("SawtoothWaveCIN"),
-    "chirp": lambda n, o: call("ChirpCIN", n, o.amplitude, o.frequency / o.rate, o.to / o.rate),
-    "white": lambda n, o: call("White2026", n, o.amplitude, o.seed, 0, 0.0),
-    "gauss": lambda n, o: call("Gauss2026", n, o.amplitude, o.seed, 0, 0.0),
-    "periodic": lambda n, o: call("PeriodNoise", n, o.amplitude, o.seed, STATE)[0],
-    "gamma": lambda n, o: o.amplitude * call("Gamma2026", n, float(o.order), o.seed, 0, 0.0),
-    "poisson": lambda n, o: o.amplitude * call("Poisson2026", n, o.mean, o.seed, 0, 0.0),
-    "binomial": lambda n, o: o.amplitude * call("Binomial2026", n, float(o.trials), o.probability,
-                                                o.seed, 0, 0.0),
-    "ramp": lambda n, o: call("RampPtrn", n, -o.amplitude, o.amplitude),
-    "pulse": lambda n, o: call("PulsePtrn", n, o.amplitude, round(o.delay * o.rate),
-                               round(o.width * o.rate)),
-    "impulse": lambda n, o: call("ImpulsePtrn", n, o.amplitude, round(o.delay * o.rate)),
-    "sinc": lambda n, o: call("SincWave", n, o.amplitude, o.delay * 2 * o.frequency,
-                              2 * o.frequency / o.rate),
-    "gauss-pulse": lambda n, o: _pulse(o, n, "GaussPulseH", o.amplitude, o.delay, 1 / o.rate,
-                                       o.frequency, 0.5, 6.0),
-    "monopulse": lambda n, o: _pulse(o, n, "GaussMonopulseH", 1 / o.rate, o.delay, o.frequency,
-                                     o.amplitude),
-    "triangle-pulse": lambda n, o: _pulse(o, n, "AperiodTriangleH", o.amplitude, o.delay,
-                                          1 / o.rate, o.width, 0.5),
+    "sine": _wave(signals.sine),
+    "square": _wave(signals.square, lambda o: o.duty / 100),
+    "triangle": _wave(signals.triangle),
+    "sawtooth": _wave(signals.sawtooth),
+    "chirp": lambda n, o: signals.chirp(n, o.frequency, o.to, o.rate, o.amplitude),
+    "white": lambda n, o: noise.uniform(n, o.amplitude, o.seed),
+    "gauss": lambda n, o: noise.gaussian(n, o.amplitude, o.seed),
+    "periodic": lambda n, o: noise.periodic(n, o.amplitude, o.seed),
+    "gamma": lambda n, o: o.amplitude * noise.gamma(n, o.order, o.seed),
+    "poisson": lambda n, o: o.amplitude * noise.poisson(n, o.mean, o.seed),
+    "binomial": lambda n, o: o.amplitude * noise.binomial(n, o.trials, o.probability, o.seed),
+    "ramp": lambda n, o: signals.ramp(n, -o.amplitude, o.amplitude),
+    "pulse": lambda n, o: signals.pulse(n, round(o.delay * o.rate), round(o.width * o.rate), o.amplitude),
+    "impulse": lambda n, o: signals.impulse(n, round(o.delay * o.rate), o.amplitude),
+    "sinc": lambda n, o: signals.sinc(n, 2 * o.frequency / o.rate, o.delay * 2 * o.frequency, o.amplitude),
+    "gauss-pulse": lambda n, o: signals.gauss_pulse(_times(n, o), o.frequency, amplitude=o.amplitude),
+    "monopulse": lambda n, o: signals.gauss_monopulse(_times(n, o), o.frequency, o.amplitude),
+    "triangle-pulse": lambda n, o: signals.triangle_pulse(_times(n, o) - o.width / 2, o.width,
+                                                             amplitude=o.amplitude),
 }
 
 

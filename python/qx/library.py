@@ -45,8 +45,7 @@ class Library:
                 ("QXHostCopyRecords", pointer, [int32, int32, pointer]),
                 ("QXHostFree", None, [pointer]),
                 ("QXHostReleaseObject", int32, [pointer]),
-                ("QXHostCallsOfComplex", None, [pointer, ctypes.c_int64] + [pointer] * 4),
-                ("QXHostCallsOfOrderAndComplex", None, [pointer, ctypes.c_int64] + [pointer] * 5),
+                ("QXHostCalls", int32, [pointer, ctypes.c_char_p, ctypes.c_int64, pointer, pointer]),
                 ("QXHostErrorText", ctypes.c_char_p, [int32]),
                 ("QXHostErrorName", ctypes.c_char_p, [int32])):
             function = getattr(self.host, name)

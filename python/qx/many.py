@@ -87,7 +87,7 @@ def report_on(name, path, options):
                 for section in sections for row in section.rows}
         rate = f"{read.rate:.6g}" if read.rate else ""
         return Outcome(name, report.page(read, sections),
-                       (str(len(read.values)), rate, *(rows.get(label, "") for label in MAIN)),
+                       (str(sections_recording.count_of(read)), rate, *(rows.get(label, "") for label in MAIN)),
                        pages.thumbnail(sections_recording.outline(read, "").curves[0]))
     except InputError as error:
         return Outcome(name, failure=str(error))
@@ -186,7 +186,7 @@ def index(found, left=()):
              f"<tbody>{rows}</tbody></table></div>"
              + (f"<h2>Not read</h2><ul>{failed}</ul>" if failed else "")
              + (f"<h2>Left out by their endings</h2><ul>{others}</ul>" if others else ""))
-    return pages.page("report", "Recordings", inner, scripts=pages.own_script("index.js"))
+    return pages.page("report", "Recordings", inner, scripts=pages.own_script("index.js"), kind="index")
 
 
 def _link(name):

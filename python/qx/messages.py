@@ -21,11 +21,11 @@ class _Pickler(pickle.Pickler):
         super().__init__(file, 5, buffer_callback=lambda buffer: self.buffers.append(buffer.raw()))
 
     def persistent_id(self, value):
-        if not isinstance(value, io.BufferedRandom):  # what tempfile.TemporaryFile gives
+        if not isinstance(value, (io.BufferedRandom, io.FileIO)):  # what tempfile.TemporaryFile gives
             return None
         value.flush()
         self.descriptors.append(value.fileno())
-        return len(self.descriptors) - 1
+        return len(self.descriptors) - 1, isinstance(value, io.FileIO)
 
 
 class _Unpickler(pickle.Unpickler):
@@ -33,8 +33,9 @@ class _Unpickler(pickle.Unpickler):
         self.descriptors = descriptors
         super().__init__(file, buffers=buffers)
 
-    def persistent_load(self, index):
-        return os.fdopen(self.descriptors[index], "r+b")
+    def persistent_load(self, place):
+        index, raw = place
+        return os.fdopen(self.descriptors[index], "r+b", 0 if raw else -1)
 
 
 class Channel:

@@ -35,15 +35,26 @@ function reduce(curves, place, first, last, most) {
   return rows;
 }
 
-// The samples of a plot that are in the page.
+// The index of the first of rising numbers that is not below one.
+function firstFrom(rising, least) {
+  let low = 0, high = rising.length;
+  while (low < high) {
+    const middle = (low + high) >> 1;
+    if (rising[middle] < least) low = middle + 1;
+    else high = middle;
+  }
+  return low;
+}
+
+// The samples of a plot that are in the page. A source has the range of its x axis, and `rows`, which gives
+// the rows of a part in at most `most` groups to the function `then`, at once or later.
 class Inside {
   constructor(plot) {
     this.curves = plot.curves.map(curve => ({lows: numbers(curve), highs: curve.highs && numbers(curve.highs)}));
     this.count = this.curves.length ? this.curves[0].lows.length : 0;
     const x = plot.x;
     this.place = x ? i => i < x.length - 1 ? x[Math.floor(i)] : x[x.length - 1] : i => plot.start + i * plot.step;
-    this.index = x ? at => { let i = x.findIndex(one => one >= at); return i < 0 ? x.length : i; }
-      : at => (at - plot.start) / plot.step;
+    this.index = x ? at => firstFrom(x, at) : at => (at - plot.start) / plot.step;
     this.range = plot.image ? [plot.image.left, plot.image.right] : [this.place(0), this.place(this.count - 1)];
     if (this.range[0] === this.range[1]) this.range = [this.range[0] - 0.5, this.range[0] + 0.5];
   }
@@ -55,6 +66,10 @@ class Inside {
 }
 
 const figures = [];
+
+// A plot in its element: caption, buttons, legend, axes and a graph of dygraphs. `window` is the part of the x
+// axis that is shown; `asked` is the latest question to the source, whose earlier answers are dropped; `busy`
+// says that the graph is being changed by us, not by the reader.
 
 class Figure {
   constructor(element, plot, source) {
@@ -144,7 +159,7 @@ class Figure {
     const plot = this.plot, names = plot.curves.length ? plot.curves.map((curve, i) => curve.name || "y" + i) : ["y"];
     const unique = names.map((name, i) => names.indexOf(name) < i ? name + " " + (i + 1) : name);
     if (this.graph) this.graph.destroy();
-    const series = {};
+    const series = {}, text = value => short(value);
     plot.curves.forEach((curve, i) => {
       series[unique[i]] = {strokeWidth: curve.dots ? 0 : 1, drawPoints: curve.dots, pointSize: 1.5};
     });
@@ -161,9 +176,9 @@ class Figure {
         labelsDiv: this.legend, legend: "always", drawGrid: !plot.image, valueRange: plot.y_range, axisLineColor: colour("grey"),
         gridLineColor: colour("grid"), gridLineWidth: 0.8, axisLabelWidth: 64, connectSeparatedPoints: false, digitsAfterDecimal: 6,
         sigFigs: 6, xRangePad: 0, yRangePad: plot.y_range ? 0 : 6, highlightCircleSize: 3,
-        axes: {x: {logscale: this.log, axisLabelFormatter: short, valueFormatter: short, pixelsPerLabel: 70},
-               y: {axisLabelFormatter: short, valueFormatter: short, pixelsPerLabel: 28, axisLabelWidth: 62}},
-        legendFormatter: found => this.told(found),
+        axes: {x: {logscale: this.log, axisLabelFormatter: text, valueFormatter: text, pixelsPerLabel: 70},
+               y: {axisLabelFormatter: text, valueFormatter: text, pixelsPerLabel: 28, axisLabelWidth: 62}},
+        legendFormatter: found => this.legendText(found),
         underlayCallback: (canvas, area, graph) => this.under(canvas, area, graph),
         ...(plot.bars ? {plotter: bars} : {}),
         drawCallback: (graph, isFirst) => this.moved(graph, isFirst),
@@ -174,12 +189,13 @@ class Figure {
     });
   }
 
-  told(found) {
+  // The legend as HTML: the curves with the values under the pointer, levels and verticals.
+  legendText(found) {
     const safe = text => String(text).replace(/[&<>"']/g, c => `&#${c.charCodeAt(0)};`);
     const parts = found.series.filter(one => this.plot.curves.length).map(one =>
       `<span style="color:${one.color}">&#9632;</span> ${safe(one.label)}` +
       (found.x !== undefined && one.y !== undefined && !isNaN(one.y) ? ` <b>${safe(short(one.y))}</b>` : ""));
-    for (const [y, label] of this.plot.levels) if (label) parts.push(`- - ${safe(label)} ${safe(short(y))}`);
+    for (const [y, label] of this.plot.levels) if (label) parts.push(`- - ${safe(label)} ${safe(short(y, 5))}`);
     for (const [, label] of this.plot.verticals) parts.push(`| ${safe(label)}`);
     if (found.x !== undefined) parts.push("at " + safe(short(found.x)));
     return parts.join(" &nbsp; ");
@@ -211,6 +227,7 @@ class Figure {
     canvas.textAlign = "center";
     for (const [y] of this.plot.levels) line(canvas, area.x, graph.toDomYCoord(y), area.x + area.w, null, "grey");
     for (const [x] of this.plot.verticals) line(canvas, graph.toDomXCoord(x), area.y, null, area.y + area.h, "warm");
+    const taken = [];  // boxes of labels
     for (const mark of this.plot.marks) {
       const [x, y] = graph.toDomCoords(mark.x, mark.y);
       if (x < area.x - 9 || x > area.x + area.w + 9) continue;
@@ -219,14 +236,24 @@ class Figure {
       canvas.beginPath();
       canvas.arc(x, y, 3.5, 0, 7);
       canvas.stroke();
-      canvas.fillStyle = colour("text");
-      if (mark.label) {
-        const half = canvas.measureText(mark.label).width / 2 + 2;
-        canvas.fillText(mark.label, Math.max(area.x + half, Math.min(x, area.x + area.w - half)),
-          Math.max(area.y + 10, y - 7));
-      }
+      if (mark.label) label(canvas, area, taken, mark.label, x, y);
     }
     canvas.restore();
+  }
+}
+
+// Writes the label of a mark above, below, left or right of it, where no other label is; else not at all.
+function label(canvas, area, taken, text, x, y) {
+  const wide = canvas.measureText(text).width + 4, high = 13;
+  for (const [left, top] of [[x - wide / 2, y - 18], [x - wide / 2, y + 6], [x - wide - 5, y - high / 2],
+    [x + 5, y - high / 2]]) {
+    const at = [Math.max(area.x, Math.min(left, area.x + area.w - wide)), Math.max(area.y, Math.min(top, area.y + area.h - high))];
+    if (Math.abs(at[1] - top) > high || taken.some(([a, b, w]) => at[0] < a + w && a < at[0] + wide &&
+        Math.abs(at[1] - b) < high)) continue;
+    taken.push([...at, wide]);
+    canvas.fillStyle = colour("text");
+    canvas.fillText(text, at[0] + wide / 2, at[1] + high - 3);
+    return;
   }
 }
 
@@ -241,12 +268,12 @@ function line(canvas, x, y, toX, toY, name) {
   canvas.setLineDash([]);
 }
 
-// A number for axes and legends.
-function short(value) {
+// A number as text.
+function short(value, digits = 9) {
   if (value !== 0 && (Math.abs(value) >= 1e7 || Math.abs(value) < 1e-4)) {
-    return Number(value.toPrecision(7)).toExponential();
+    return Number(value.toPrecision(Math.min(7, digits))).toExponential();
   }
-  return String(Number(value.toPrecision(9)));
+  return String(Number(value.toPrecision(digits)));
 }
 
 function bars(event) {

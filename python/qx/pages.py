@@ -7,6 +7,7 @@ that it needs nothing from elsewhere. Where the package is missing they are draw
 import functools
 import html
 import json
+import re
 from datetime import datetime, timezone
 from pathlib import Path
 
@@ -82,9 +83,12 @@ def body(sections):
 def table(rows):
     if not rows:
         return []
+    def source(row):  # which may be broken behind a mark
+        return re.sub(r"([._,(])", r"\1<wbr>", html.escape(row.source))
+
     cells = "".join(f'<tr><td>{html.escape(row.label)}</td><td class="value">{html.escape(row.value)}'
                     + (f' <span class="error">± {html.escape(row.error)}</span>' if row.error else "")
-                    + f'</td><td>{html.escape(row.unit)}</td><td class="source">{html.escape(row.source)}</td></tr>\n'
+                    + f'</td><td>{html.escape(row.unit)}</td><td class="source">{source(row)}</td></tr>\n'
                     for row in rows)
     return [f'<div class="wide"><table><thead><tr><th>Quantity</th><th>Value</th><th></th><th>From</th></tr></thead>'
             f"<tbody>{cells}</tbody></table></div>"]
@@ -94,9 +98,9 @@ def own_script(name):
     return script((HERE / name).read_text("utf-8"))
 
 
-def page(command, title, inner, sections=None, scripts="", moving=False):
+def page(command, title, inner, sections=None, scripts="", moving=False, kind=""):
     """A whole page; `inner` is HTML below the title, before the sections; `scripts` are elements for its end, which
-    have plots of their own where it is `moving`."""
+    have plots of their own where it is `moving`; `kind` is a class of the style."""
     library = dygraphs()
     made = datetime.now(timezone.utc).strftime("%Y-%m-%d %H:%M UTC")
     drawn = body(sections) if sections is not None else ""
@@ -104,7 +108,8 @@ def page(command, title, inner, sections=None, scripts="", moving=False):
     if not moves and sections is not None and plots_of(sections):
         inner += f"<p class=\"quiet\">{html.escape(STILL)}</p>"
     return (f'<!DOCTYPE html>\n<html lang="en"><head>{HEAD}{outputs.generator(command)}'
-            f"<title>{html.escape(title)}</title><style>{library[1] if moves else ''}{style()}</style></head><body>\n"
+            f"<title>{html.escape(title)}</title><style>{library[1] if moves else ''}{style()}</style></head>"
+            f'<body class="{kind}">\n'
             f"<h1>{html.escape(title)}</h1>\n{inner}\n{drawn}\n"
             f"<footer>Made {made} by python3 -m qx {command}.</footer>"
             f"{script(library[0]) + own_script('page.js') if moves else ''}{scripts}</body></html>\n")

@@ -33,8 +33,9 @@ class Recording:
     channel: str  # name of the column or channel
     notes: list  # comment lines of the file
     choice: str = ""  # what was taken from the file, and why
-    whole: object = None  # figures of the whole file (Whole) where the values are a part of it
-    envelope: object = None  # the outline of the whole file (Envelope), where it was not read from a later sample
+    whole: object = None  # all samples (Whole) where the values are the first of them only
+    envelope: object = None  # the outline of all samples (Envelope), with gaps where values are left out
+    row_rate: float | None = None  # of the outlines, where it may be another than that of the values
     others: list = dataclasses.field(default_factory=list)  # the other channels (Channel)
 
     def times(self):
@@ -67,8 +68,11 @@ def read(path, rate=None, column=None, decimal=None, missing=None, start=0, time
     refused, or "skip" or "interpolate"; `start` samples are left out. `outline` makes what the values of each
     channel are added to: the `envelope` of the recording and of the other channels; `progress` is told of each
     part how many samples it has. The file is read in a process of its own, with limits (qx/isolation.py)."""
-    return isolation.read(_read, path, rate, column, decimal, missing, start, time, dates, thousands, outline,
-                          told=progress)
+    recording = isolation.read(_read, path, rate, column, decimal, missing, start, time, dates, thousands, outline,
+                               told=progress)
+    if recording.whole:
+        recording.whole.progress = progress
+    return recording
 
 
 def _read(progress, path, file, rate, column, decimal, missing, start, time, dates, thousands, outline):
@@ -80,7 +84,9 @@ def _read(progress, path, file, rate, column, decimal, missing, start, time, dat
             reader = table_of(source, time, options, column)
             habit = rates.Habit(reader.layout.shown, {"comma": ",", "point": "."}.get(decimal, ""), thousands)
             recording = _of_table(reader, column, time, missing, start, rate, habit, outline, progress)
-    lowest, highest = float(recording.values.min()), float(recording.values.max())
+    some = recording.whole and recording.whole.moments
+    lowest, highest = ((some.least, some.greatest) if some else
+                       (float(recording.values.min()), float(recording.values.max())))
     if highest - lowest > WIDEST:
         raise InputError(f"{source.path}: from {lowest:g} to {highest:g} is more than a plot can span")
     if rate is not None:
@@ -139,17 +145,17 @@ def _of_audio(source, column, start, outline, progress):
     shown = [Channel(f"channel {i + 1} of {channels}", "FS", outlines[i]) for i in sorted(outlines)[:MOST_CHANNELS]]
     others = f"; others: {_listed(f'channel {i + 1}' for i in range(channels) if i + 1 != channel)}"
     choice = f"channel {channel} of {channels}; {{rate}}{others * (channels > 1)}"
-    choice += _part(start, len(values), frames)
+    choice += _part(start, len(values), frames - start)
     if wrong := audio.wrong_length(path, frames):
         choice += f"; {wrong}"
     return Recording(source.name, values, rate or None, "from the header of the file", "FS",
-                     f"channel {channel} of {channels}", [], choice, _if_longer(whole),
-                     None if start else whole.envelope, shown)
+                     f"channel {channel} of {channels}", [], choice, _if_longer(whole), whole.envelope, others=shown)
 
 
 def _if_longer(whole):
-    """The figures of all samples where the values are a part of them."""
-    return whole if whole.count > MOST_SAMPLES else None
+    """All samples, where the values are a part of them."""
+    whole.finish()
+    return whole if whole.count else None
 
 
 def _listed(names, most=12):
@@ -157,11 +163,11 @@ def _listed(names, most=12):
     return ", ".join(names[:most]) + f" and {len(names) - most} more" * (len(names) > most)
 
 
-def _part(start, count, all_of_them):
-    """What is told where the memory holds a part of a recording only."""
-    if all_of_them > MOST_SAMPLES:
-        return (f"; samples {start + 1} to {start + count} of {all_of_them}, since at most {MOST_SAMPLES} "
-                "are analysed at once (--start takes others)")
+def _part(start, count, there):
+    """What is said where the memory holds a part of a recording only; `there` are `start` samples less than all."""
+    if there > MOST_SAMPLES:
+        return (f"; samples {start + 1} to {start + count} of {start + there} are kept in memory, which holds "
+                f"{MOST_SAMPLES} (--start takes others)")
     return f"; without the first {start} samples" if start else ""
 
 
@@ -173,12 +179,14 @@ def _of_table(reader, column, time, missing, start, rate, habit, outline, progre
     time = None if rate else _time_column(reader, [c for c in clocks if c != chosen])
     others = [c for c in _numeric(reader) if c not in (chosen, time, *clocks, *indices)][:MOST_CHANNELS]
     outlines = {c: outline() for c in others}
-    whole = Whole(MOST_SAMPLES, outline, progress)
+    whole = Whole(MOST_SAMPLES, outline, progress, missing == "interpolate")
     values, seconds, said = _columns(reader, chosen, time, start, outlines, whole)
     if not len(values):
         raise InputError(f"{path}: has no value from sample {start + 1} on")
-    holes = np.isnan(values)
+    count, holes, row_rate = len(values), np.isnan(values), None
     if holes.any():
+        if missing == "skip" and time is not None:
+            row_rate, _ = _rate(reader, seconds, time, habit)
         values, seconds, treated = _without_holes(path, values, seconds, holes, missing)
         said.append(treated)
     source = ""
@@ -186,13 +194,13 @@ def _of_table(reader, column, time, missing, start, rate, habit, outline, progre
         rate, source = _rate(reader, seconds, time, habit)
     label, unit = _label(layout, chosen, reader.notes)
     choice = "; ".join([*_told_of_columns(reader, values, chosen, time, indices), *reader.told, *said])
-    choice += _part(start, len(values), whole.count)
+    choice += _part(start, count, whole.rows)
     shown = []
     for c, one in outlines.items():
         name, its_unit = _label(layout, c, reader.notes)
         shown.append(Channel(name, its_unit, one))
     return Recording(reader.name, values, rate, source, unit, label, reader.notes, choice,
-                     _if_longer(whole), None if start else whole.envelope, shown)
+                     _if_longer(whole), whole.envelope, row_rate, shown)
 
 
 def _refuse_wrapped(reader, column):
@@ -317,7 +325,7 @@ def _columns(reader, chosen, time, start, outlines, whole):
         seen += len(part[chosen])
         for c in columns:
             kept[c].append(part[c][first:max(first, last)])
-        whole.add(part[chosen][~np.isnan(part[chosen])])
+        whole.add(part[chosen][first:])
         for c in list(outlines):
             if part[c] is None:
                 del outlines[c]

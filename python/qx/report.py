@@ -41,6 +41,9 @@ def lines(recording, sections):
         yield from (f"  {line}" for line in section.terminal)
 
 
+OF_A_PART = (cleaned, events)  # sections that have no more than the samples in memory
+
+
 def sections_of(recording):
     found = []
     for make in SECTIONS:
@@ -49,6 +52,8 @@ def sections_of(recording):
         except QxError as error:
             section = Section(make.__name__.replace("_", " ").capitalize(),
                               f"Not possible for this recording: {error}.")
+        if section and recording.whole and make in OF_A_PART:
+            section.text += f" Of the first {len(recording.values)} of these samples."
         if section:
             found.append(section)
     return found

@@ -9,10 +9,8 @@ from typing import Any
 import numpy as np
 import soundfile
 
-from . import audio, isolation, outputs
-from .calls import call
+from . import audio, isolation, multirate, outputs
 from .files import InputError
-from .multirate import low_pass
 
 FRAMES_AT_ONCE = 1 << 15
 LARGEST_FACTOR = 1 << 17  # beyond it the taps fill the memory
@@ -24,40 +22,26 @@ SAMPLE_BYTES = {"PCM_U8": 1, "PCM_16": 2, "PCM_24": 3, "PCM_32": 4, "FLOAT": 4}
 
 
 class Resampler:
-    """A stream of frames, one to a row, from one rate to another. Frame 0 stays at time 0."""
+    """Frames of a file at another rate, one to a row, block by block, and what is said of them afterwards."""
 
-    def __init__(self, rate, new_rate, channels, **design):
+    def __init__(self, rate, new_rate, channels):
         common = math.gcd(rate, new_rate)
         self.up, self.down = new_rate // common, rate // common
         if max(self.up, self.down) > LARGEST_FACTOR:
             raise ValueError(f"{rate} and {new_rate} Hz have too small a common divisor, {common}")
-        self.taps = low_pass(self.up, self.down, **design)
-        self.channels = channels
-        self.read = self.written = 0
+        self.stream = multirate.Resampler(self.up, self.down, channels, axis=0)
+        self.read = 0
         self.clipped, self.highest, self.format_note = 0, 0.0, ""
         self.sound, self.wrong = None, ""
-        self.reset, self.offset, self.count, self.state = 1, 0, 0, np.zeros((0, 0))
 
     def put(self, frames):
         """The frames at the new rate that these and those before make whole."""
         self.read += len(frames)
-        # The positions of a call, `up` to each frame in hand, have room in 30 bits.
-        most = min(FRAMES_AT_ONCE, 2 ** (29 - (self.up - 1).bit_length()))
-        return np.concatenate([self._resample(frames[first:first + most])
-                               for first in range(0, len(frames), most)] or [frames])
+        return self.stream(frames)
 
     def end(self):
-        """The last frames, whose windows reach beyond the end."""
-        due = -(-self.read * self.up // self.down) - self.written
-        return self._resample(np.zeros((len(self.taps) // 2 // self.up + 1, self.channels)))[:due]
-
-    def _resample(self, frames):
-        self.offset, self.state, self.count, resampled = call(
-            "RationalResampleMultiCh_H", np.ascontiguousarray(frames.T), self.up, self.down,
-            self.reset, self.offset, self.taps, self.state, self.count)
-        self.reset = 0
-        self.written += resampled.shape[1]
-        return resampled.T
+        """The last frames, whose filter reaches beyond the end."""
+        return self.stream.finish()
 
 
 @dataclasses.dataclass

@@ -1,6 +1,7 @@
 """The section of the report that takes mains hum and baseline wander out of a recording that has them, with
 filters designed for its rate."""
 
+import contextlib
 import dataclasses
 
 import numpy as np
@@ -27,26 +28,32 @@ class Hum:
     excess: float  # over the median of its neighbours
 
 
-def line_at(recording, frequency):
-    """The amplitude of the tone within the notch, and by how much the line exceeds the median around it."""
+def lines_of(recording):
+    """The spectrum up to the highest frequency that is looked at: its frequencies and amplitudes."""
     found = spectra.periodogram(recording.values, recording.rate, "hann", scaling="spectrum")
-    away = np.abs(found.frequencies - frequency)
-    lines = np.sqrt(2 * found.values)
+    count = int(np.searchsorted(found.frequencies, MAINS[-1] + 6 * NOTCH))
+    return found.frequencies[:count].copy(), np.sqrt(2 * found.values[:count])
+
+
+def line_at(recording, frequency, spectrum):
+    """The amplitude of the tone within the notch, and by how much the line exceeds the median around it; `spectrum`
+    is what lines_of returns."""
+    frequencies, lines = spectrum
+    away = np.abs(frequencies - frequency)
     line = lines[away <= NOTCH].max(initial=0.0)
     around = lines[(away > NOTCH) & (away <= 5 * NOTCH)]
     floor = np.median(around) if len(around) else 0.0
-    if not floor > 0:
-        return line, 0.0
-    try:
-        line_ = measure.tone(recording.values, recording.rate, frequency, NOTCH).amplitude
-    except QxError:
-        line_ = line
-    return line_, line / floor
+    if not line > STANDS_OUT * floor > 0:  # the tone behind the line is of no interest
+        return line, line / floor if floor > 0 else 0.0
+    with contextlib.suppress(QxError):
+        return measure.tone(recording.values, recording.rate, frequency, NOTCH).amplitude, line / floor
+    return line, line / floor
 
 
 def hum_of(recording):
     """The hum of the mains; None where neither frequency stands out."""
-    found = [Hum(mains, *line_at(recording, mains)) for mains in MAINS if mains + 5 * NOTCH < recording.rate / 2]
+    spectrum = lines_of(recording)
+    found = [Hum(mains, *line_at(recording, mains, spectrum)) for mains in MAINS if mains + 5 * NOTCH < recording.rate / 2]
     return max((one for one in found if one.excess > STANDS_OUT), key=lambda one: one.excess, default=None)
 
 
@@ -90,7 +97,8 @@ def cleaned(recording):
             "highpass removes it. ")
     if hum:
         after = bandstop.zero_phase(after)
-        rest, _ = line_at(dataclasses.replace(recording, values=after), hum.mains)
+        left = dataclasses.replace(recording, values=after)
+        rest, _ = line_at(left, hum.mains, lines_of(left))
         before = uncertain(hum.amplitude, hum.amplitude / hum.excess)
         rows += [Row(f"Hum at {hum.mains:g} Hz, before", before[0], unit, "measure.tone", before[1]),
                  Row(f"Hum at {hum.mains:g} Hz, after", number(rest, 4), unit, source + ", measure.tone")]

@@ -1,5 +1,6 @@
 """Sections of the report: the recording, its statistics, its histogram."""
 
+import dataclasses
 import math
 
 import numpy as np
@@ -24,9 +25,11 @@ def over_time(recording, title, **more):
 def outline(recording, title, channel=None):
     """The whole of a recording, or of another of its channels, that may be longer than what is kept."""
     channel = channel or recording
-    plot = over_time(recording, title)
+    of_rows = dataclasses.replace(recording, rate=recording.row_rate or recording.rate)
+    plot = over_time(of_rows, title)
+    plot.link = TIME if of_rows.rate == recording.rate else "rows"
     plot.y_label = quantity(channel)
-    if channel.envelope is None or channel is recording and not recording.whole:
+    if channel is recording and (channel.envelope is None or channel.envelope.count == len(recording.values)):
         plot.curves = [figures.Curve(channel.channel, channel.values)]
         return plot
     lows, highs = channel.envelope.bounds()
@@ -36,8 +39,13 @@ def outline(recording, title, channel=None):
     return plot
 
 
+def count_of(recording):
+    """How many samples the recording has, those included that are not in memory."""
+    return recording.whole.count if recording.whole else len(recording.values)
+
+
 def overview(recording):
-    n, unit = len(recording.values), recording.unit
+    n, unit = count_of(recording), recording.unit
     counted = f"{n} sample" + "s" * (n != 1)
     shown = [outline(recording, "The whole recording" if not recording.others else recording.channel)]
     for other in recording.others:
@@ -51,33 +59,27 @@ def overview(recording):
         text += f" Values in {unit}."
     if recording.others:
         text += f" The other sections have the first of {len(shown)} channels."
-    return Section("Recording", text, _rows_of_whole(recording), shown)
-
-
-def _rows_of_whole(recording):
-    """Figures of the whole file where the other sections have a part of it."""
-    whole, unit = recording.whole, recording.unit
-    if not whole:
-        return []
-    lows, highs = whole.envelope.bounds()
-    return [Row("Samples in the file", str(whole.count), "", "read in parts"),
-            Row("Mean of all", number(whole.mean), unit, "stats.mean"),
-            Row("Root mean square of all", number(whole.rms), unit, "stats.rms"),
-            Row("Lowest of all", number(lows.min()), unit, "read in parts"),
-            Row("Highest of all", number(highs.max()), unit, "read in parts")]
+    return Section("Recording", text, figures=shown)
 
 
 def statistics(recording):
-    x, unit = recording.values, recording.unit
-    mean = stats.mean(x)
-    moments = {order: stats.moment(x, order) for order in (2, 3, 4)}
-    bins = bins_for(len(x))
-    shown = [mean, stats.rms(x), stats.median(x), *stats.mode(x, bins)[:4]]
+    x, whole, unit = recording.values, recording.whole, recording.unit
+    bins = 120 if whole else bins_for(len(x))
+    if whole:
+        counts, centres = whole.histogram(bins)
+        moments = {order: whole.moments.moment(order) for order in (2, 3, 4)}
+        extremes = whole.moments.least, whole.moments.greatest
+        shown = [whole.moments.mean, whole.moments.rms, whole.median, *centres[counts == counts.max()][:4]]
+    else:
+        moments = {order: stats.moment(x, order) for order in (2, 3, 4)}
+        extremes = float(x.min()), float(x.max())
+        shown = [stats.mean(x), stats.rms(x), stats.median(x), *stats.mode(x, bins)[:4]]
     # Digits for a thousandth of the range, and no less than six.
-    mean_, rms, median, *modes = (max(pair, key=len) for pair in zip(
-        map(number, shown), resolved(shown, 1e-3 * float(np.ptp(x)))))
+    lowest, highest, mean_, rms, median, *modes = (max(pair, key=len) for pair in zip(
+        map(number, [*extremes, *shown]), resolved([*extremes, *shown], 1e-3 * (extremes[1] - extremes[0]))))
     rows = [Row("Mean", mean_, unit, "stats.mean"), Row("Root mean square", rms, unit, "stats.rms"),
             Row("Median", median, unit, "stats.median"),
+            Row("Lowest", lowest, unit, "samples"), Row("Highest", highest, unit, "samples"),
             Row(f"Mode, fullest of {bins} bins", ", ".join(modes) or "none", unit, "stats.mode")]
     rows += [Row(f"Central moment of order {order}", number(moment), power_unit(unit, order),
                  "stats.moment") for order, moment in moments.items()]
@@ -88,20 +90,19 @@ def statistics(recording):
                         "moment 3 / deviation³"))
         rows.append(Row("Kurtosis", number(moments[4] / deviation**4), "",
                         "moment 4 / deviation⁴"))
-    return Section("Statistics", "All moments are about the mean and divided by the number of "
-                   "samples.", rows)
+    text = "All moments are about the mean and divided by the number of samples."
+    if whole:
+        text += f" Of all {whole.count} samples."
+    return Section("Statistics", text, rows)
 
 
 def histogram(recording):
     x = recording.values
     whole = recording.whole
     if whole:
-        counts, first, width = whole.histogram.shown(120)
-        centres = first + width * np.arange(len(counts))
-        mean, median = whole.mean, whole.histogram.median()
-        coarse, first, step = whole.histogram.shown(12)
-        coarse_centres = first + step * np.arange(len(coarse))
-        source = f"Equal bins over all {whole.count} samples of the file."
+        (counts, centres), (coarse, coarse_centres) = whole.histogram(120), whole.histogram(12)
+        mean, median = whole.moments.mean, whole.median
+        source = f"Equal bins over the range of all {whole.count} samples."
     else:
         found, few = stats.histogram(x, bins_for(len(x))), stats.histogram(x, 12)
         counts, centres, coarse, coarse_centres = found.counts, found.centres, few.counts, few.centres

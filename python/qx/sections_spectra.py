@@ -5,12 +5,11 @@ import math
 
 import numpy as np
 
-from . import figures, spectra, stats, tones
+from . import figures, long_tones, spectra, stats, tones
 from .sections import (Row, Section, frequency_axis, frequency_unit, number, power_unit, resolved, time_axis,
                        uncertain)
 from .sections_recording import TIME
 
-MOST_OF_TONES = 1 << 20  # samples in which tones are measured
 LONGEST = 1 << 17  # segment of an averaged spectrum
 SEGMENTS = 4  # without overlap, of a short one
 COLUMNS, LEVELS = 800, 80.0  # of the spectrum over time; decibels
@@ -18,6 +17,8 @@ SQUARES = (1e-140, 1e140)  # values whose squares are numbers
 
 
 def is_constant(recording):
+    if recording.whole:
+        return not recording.whole.moments.greatest > recording.whole.moments.least
     return not np.ptp(recording.values) > 0
 
 
@@ -33,11 +34,13 @@ def amplitudes(recording, window="blackman_harris"):
         return None
     if is_constant(recording):
         return Section("Amplitude spectrum", "The recording is constant: it has no parts above 0.")
-    rate = recording.rate or 1.0
-    first = max(0, (n - MOST_OF_TONES) // 2)
-    values = recording.values[first:first + MOST_OF_TONES]
-    frequencies, shown, resolution = tones.spectrum(values, rate, window)
-    found = tones.strongest(values, rate)
+    rate, whole = recording.rate or 1.0, recording.whole
+    if whole:
+        frequencies, shown, resolution = long_tones.spectrum(whole, rate, window)
+        found = long_tones.strongest(whole, rate)
+    else:
+        frequencies, shown, resolution = tones.spectrum(recording.values, rate, window)
+        found = tones.strongest(recording.values, rate)
     unit = frequency_unit(recording)
     rows, marks = [], []
     if found:
@@ -56,8 +59,9 @@ def amplitudes(recording, window="blackman_harris"):
             rows.append(Row("Strongest part at", resolved([frequencies[peaks[0]]], resolution)[0], unit,
                             "spectra.periodogram", number(resolution / 2, 2)))
     rows.append(Row("Resolution", number(resolution, 4), unit, "spectra.periodogram"))
-    if len(values) < n:
-        text += f" Of the {len(values)} samples in the middle."
+    if whole:
+        text += (f" Tones of all {whole.count} samples; the spectrum is the root mean square over half-overlapped segments"
+                 f" of {long_tones.SEGMENT} samples.")
     largest = shown.max() or 1.0
 
     def decibels(amplitude):
@@ -82,17 +86,20 @@ def power(recording, window="hann"):
     n = len(recording.values)
     if n < 16:
         return None
-    x = recording.values
-    largest = float(np.abs(x - x.mean()).max())
+    x, whole = recording.values, recording.whole
+    if whole:
+        largest = float(max(whole.moments.greatest - whole.moments.mean, whole.moments.mean - whole.moments.least))
+    else:
+        largest = float(np.abs(x - x.mean()).max())
     if not SQUARES[0] < largest < SQUARES[1]:
         what = (f"The squares of values around {largest:.2g} leave the range of numbers, so there is no "
                 "power spectrum." if largest else "The recording is constant: it has no power beside its "
                 "mean.")
         return Section("Averaged power spectrum", what)
     rate = recording.rate or 1.0
-    if recording.whole:
-        found, variance = recording.whole.spectrum.result(rate), recording.whole.rms**2 - recording.whole.mean**2
-        of = f"of all {recording.whole.count} samples of the file"
+    if whole:
+        found, variance = whole.spectrum(rate, LONGEST, window), whole.moments.moment(2)
+        of = f"without their means, of all {whole.count} samples"
     else:
         found, variance = spectra.welch(x, rate, window, segment_length(n)), stats.var(x)
         of = "without their means"
@@ -116,13 +123,18 @@ def power(recording, window="hann"):
 
 def over_time(recording, window="hann"):
     """The density of power by time and frequency, in decibels."""
-    n = len(recording.values)
-    largest = float(np.abs(recording.values).max())
+    whole = recording.whole
+    n = whole.count if whole else len(recording.values)
+    largest = (max(-whole.moments.least, whole.moments.greatest) if whole else
+               float(np.abs(recording.values).max()))
     if n < 256 or not SQUARES[0] < largest < SQUARES[1] or is_constant(recording):
         return None
     rate = recording.rate or 1.0
     length = 2 ** min(9, max(4, round(math.log2(2 * math.sqrt(n)))))
-    decibels, resolution = _columns(recording.values, rate, length, window)
+    hop = max(length // 2, -(-n // COLUMNS))
+    parts = (whole.parts(hop, max(length, hop)) if whole else
+             (recording.values[start:start + max(length, hop)] for start in range(0, n, hop)))
+    decibels, resolution = _columns(parts, rate, length, window)
     top = float(decibels.max())
     bottom = max(top - LEVELS, float(np.percentile(decibels, 2)))
     shown = np.clip(np.round((decibels - bottom) / ((top - bottom) or 1.0) * 255), 0, 255).astype(np.uint8)
@@ -136,13 +148,12 @@ def over_time(recording, window="hann"):
     return Section("Spectrum over time", f"{image.label}.", [], [plot])
 
 
-def _columns(x, rate, length, window):
-    """Decibels by frequency and time, no more columns than COLUMNS, each the mean of its segments."""
-    hop = max(length // 2, -(-len(x) // COLUMNS))
+def _columns(parts, rate, length, window):
+    """Decibels by frequency and time, each column the mean of the segments of a part."""
     columns, resolution = [], 0.0
-    for start in range(0, len(x) - length + 1, hop):
-        part = x[start:start + max(length, hop)]
-        found = spectra.welch(part, rate, window, length, length // 2)
-        columns.append(found.values)
-        resolution = found.resolution
+    for part in parts:
+        if len(part) >= length:
+            found = spectra.welch(part, rate, window, length, length // 2)
+            columns.append(found.values)
+            resolution = found.resolution
     return 10 * np.log10(np.maximum(np.array(columns).T, 1e-300)), resolution

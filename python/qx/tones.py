@@ -30,7 +30,7 @@ class Tones:
     resolution: float  # one over the length of the recording
 
 
-def tones(values, rate=1.0, count=5):
+def tones(values, rate=1.0, count=5, lines_of=None):
     """Up to `count` tones, fewer where the rest could be noise; a QxError where all values are equal.
 
     The uncertainties are the least that an unbiased estimate from n samples has, with the density of the
@@ -38,7 +38,8 @@ def tones(values, rate=1.0, count=5):
     sqrt(3 S fs / (n (n^2 - 1))) fs / (pi A) of the frequency (D. C. Rife and R. R. Boorstyn, "Single-tone
     parameter estimation from discrete-time observations", 1974). What a tone has about it that is no
     tone, such as a changing amplitude, counts as noise. A tone is significant where the ratio of its line to the mean of
-    those around it has a chance below FALSE in noise, by the F distribution and for n / 2 lines."""
+    those around it has a chance below FALSE in noise, by the F distribution and for n / 2 lines, or those of
+    `lines_of` samples of which the values are a band."""
     n = len(values)
     scale = float(np.abs(values).max()) or 1.0
     x = values / scale
@@ -55,13 +56,18 @@ def tones(values, rate=1.0, count=5):
     return Tones(found.frequencies,
                  rate * np.sqrt(3 * noise * rate / (n * (float(n)**2 - 1))) / (math.pi * found.amplitudes),
                  scale * found.amplitudes, scale * np.sqrt(noise * rate / n), found.phases,
-                 strength > FREE * ((n / 2 / FALSE) ** (1 / FREE) - 1), scale * found.residual, rate / n)
+                 strength > FREE * (((lines_of or n) / 2 / FALSE) ** (1 / FREE) - 1), scale * found.residual, rate / n)
 
 
 def strongest(values, rate, count=5):
     """The `tones` that stand out; None where there are none."""
+    return standing_out(lambda: tones(values, rate, count))
+
+
+def standing_out(measure_them):
+    """The significant ones of measured tones; None where there are none."""
     try:
-        found = tones(values, rate, count)
+        found = measure_them()
     except QxError as error:
         if not error.name.startswith("ErrMeasure"):
             raise
@@ -82,10 +88,9 @@ def spectrum(values, rate=1.0, window=WINDOW):
     return found.frequencies, scale * amplitudes, found.resolution
 
 
-def plot(recording, found, analysis):
-    """The spectrum in dB of the largest tone, with the tones and the harmonics."""
-    scale, _ = frequency_axis(recording)
-    frequencies, amplitudes, resolution = spectrum(recording.values, scale)
+def plot(recording, found, analysis, drawn):
+    """The spectrum in dB of the largest tone, with the tones and the harmonics; `drawn` is what `spectrum` returns."""
+    frequencies, amplitudes, resolution = drawn
     largest = found.amplitudes[0]
 
     def decibels(amplitudes):
@@ -94,7 +99,8 @@ def plot(recording, found, analysis):
     lines = decibels(amplitudes)
     bottom = min(decibels(found.amplitudes).min(), np.median(lines)) - 25
     seen = np.nan_to_num(analysis.amplitudes) > largest * 10**(bottom / 20)
-    marks = [figures.Mark(f, decibels(a), "", figures.BLUE) for f, a in zip(found.frequencies, found.amplitudes)]
+    marks = [figures.Mark(f, decibels(a), "", figures.BLUE) for f, a, is_tone in zip(
+        found.frequencies, found.amplitudes, found.significant) if is_tone]
     marks += [figures.Mark(analysis.frequencies[h], decibels(analysis.amplitudes[h]), str(h + 1))
               for h in np.flatnonzero(seen)]
     return figures.Plot(

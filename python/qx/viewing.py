@@ -115,15 +115,12 @@ class Opened:
             self.version += 1
 
     def _take(self, read):
-        main = read.envelope
-        if main is None or main.count != len(read.values) and not read.whole:
-            main = Levels()  # missing values have been filled in
-            main.add(read.values)
-        channels = [(read.channel, read.unit, main)]
+        channels = [(read.channel, read.unit, read.envelope)]
         channels += [(other.channel, other.unit, other.envelope) for other in read.others]
         for *_, levels in channels:
             levels.finish()
-        self.recording, self.channels = dataclasses.replace(read, others=[], whole=None, envelope=None), channels
+        self.recording, self.channels = dataclasses.replace(
+            read, rate=read.row_rate or read.rate, others=[], whole=None, envelope=None), channels
 
     def plots(self):
         """The plots of the channels, whose samples are asked for as they are needed."""
@@ -154,18 +151,24 @@ class Opened:
             last = first + MOST
             said = f" The first {MOST} samples of the part."
         values = np.array(levels.values[first:last])
-        values = values[np.isfinite(values)]
-        if len(values) < 2:
+        there = np.isfinite(values)
+        if there.sum() < 2:
             raise InputError("the part has fewer than two samples")
-        part = dataclasses.replace(self.recording, channel=name, unit=unit, values=values)
+        part = dataclasses.replace(self.recording, channel=name, unit=unit, values=values[there])
+        known = part  # what statistics are made of; the rest needs even times
+        if not there.all():
+            at = np.arange(len(values))
+            part = dataclasses.replace(part, values=np.interp(at, at[there], values[there]))
+            said += (f" {len(values) - there.sum()} missing values are left out of statistics and histogram, and "
+                     "interpolated elsewhere.")
         unit_ = part.time_unit
         found = [Section("What is analysed", f"{name}: {len(values)} samples from {number(first / rate, 9)} to "
                          f"{number((last - 1) / rate, 9)} {unit_}.{said}")]
         if choices.kind != "none":
             section, after = filtered(part, choices.kind, choices.edges, choices.order)
             found.append(section)
-            part = dataclasses.replace(part, values=after)
-        for make in (sections_recording.statistics, sections_recording.histogram,
+            known = part = dataclasses.replace(part, values=after)
+        for make in (lambda one: sections_recording.statistics(known), lambda one: sections_recording.histogram(known),
                      lambda one: sections_spectra.amplitudes(one, choices.window),
                      lambda one: sections_spectra.power(one, choices.window),
                      lambda one: sections_spectra.over_time(one, choices.window), events):

@@ -1,120 +1,225 @@
-"""Figures of a recording of any length, part by part: moments, outline, histogram and spectrum."""
+"""Figures of a recording of any length: what one pass gives is summed up while the file is read; the samples
+go to a temporary file of which further passes take blocks, so the memory does not depend on the length."""
 
-from typing import Any
+import functools
+import tempfile
 
 import numpy as np
 
 from . import spectra, stats
 from .envelopes import Envelope
 
-SEGMENT = 1 << 16  # samples, of the averaged spectrum
+BLOCK = 1 << 20  # samples in memory at once
+FINE = 120 * 512  # bins of which those of histograms are sums
+SELECTED = 1 << 22  # samples among which a rank is found by sorting
 
 
-class Histogram:
-    """Counts in equal bins, which become wider by factors of two when values are beyond them."""
-
-    BINS = 1 << 12
+class Moments:
+    """Count, mean, sums of powers of the differences from it, and extremes, part by part. The first value is taken
+    from all, so that nothing is lost of a small spread far from zero. Parts are joined by the
+    formulas of P. Pébay, "Formulas for robust, one-pass parallel computation of covariances and arbitrary-order
+    statistical moments", 2008."""
 
     def __init__(self):
-        self.counts, self.low, self.width = np.zeros(self.BINS, np.int64), None, 0.0
+        self.count, self.sums = 0, np.zeros(3)
+        self._first, self._mean = None, np.float64(0)
+        self.least, self.greatest = np.inf, -np.inf
 
     def add(self, values):
-        least, greatest = float(values.min()), float(values.max())
-        if self.low is None:
-            self.width = (greatest - least) / (self.BINS // 2) or max(abs(least), 1e-300) * 1e-9
-            self.low = least - self.width * self.BINS / 4
-        while least < self.low:
-            self._widen(self.BINS // 2)
-        while greatest >= self.low + self.width * self.BINS:
-            self._widen(0)
-        places = ((values - self.low) / self.width).astype(np.int64)
-        self.counts += np.bincount(np.clip(places, 0, self.BINS - 1), minlength=self.BINS)
+        self.least, self.greatest = min(self.least, float(values.min())), max(self.greatest, float(values.max()))
+        self._first = values[0] if self._first is None else self._first
+        values = values - self._first
+        a, b, n = self.count, len(values), self.count + len(values)
+        mean = np.float64(stats.mean(values))
+        mine, theirs = self.sums, np.array([b * stats.moment(values, order) for order in (2, 3, 4)])
+        with np.errstate(over="ignore", invalid="ignore"):
+            d, p, q = mean - self._mean, a / n, b / n
+            self.sums = mine + theirs + np.array([
+                d**2 * a * q,
+                d**3 * a * q * (p - q) + 3 * d * (p * theirs[0] - q * mine[0]),
+                d**4 * a * q * (p * p - p * q + q * q) + 6 * d**2 * (p * p * theirs[0] + q * q * mine[0])
+                + 4 * d * (p * theirs[1] - q * mine[1])])
+            self._mean = self._mean + d * q
+        self.count = n
 
-    def _widen(self, shift):
-        self.low -= shift * 2 * self.width
-        halves = self.counts.reshape(-1, 2).sum(1)
-        self.counts = np.zeros(self.BINS, np.int64)
-        self.counts[shift:shift + len(halves)] = halves
-        self.width *= 2
+    @property
+    def mean(self):
+        return float(self._first + self._mean)
 
-    def shown(self, most):
-        """No more than `most` counts of bins in use, the first centre and the width."""
-        used = np.flatnonzero(self.counts)
-        first, last = used[0], used[-1] + 1
-        group = -(-(last - first) // most)
-        counts = np.add.reduceat(self.counts[first:last], np.arange(0, last - first, group))
-        return counts, self.low + (first + group / 2) * self.width, group * self.width
+    def moment(self, order):
+        """The central moment of order 2, 3 or 4."""
+        return float(self.sums[order - 2] / self.count)
 
-    def median(self):
-        """To within half a bin."""
-        middle = np.searchsorted(np.cumsum(self.counts), (self.counts.sum() + 1) // 2)
-        return self.low + (middle + 0.5) * self.width
+    @property
+    def rms(self):
+        return float(np.hypot(self.mean, np.sqrt(self.moment(2))))
 
 
 class AveragedSpectrum:
     """The spectrum of spectra.welch by segments that overlap by half, part by part."""
 
-    def __init__(self, segment=SEGMENT, window="hann"):
-        self.segment, self.window = segment, window
-        self._sum: Any = 0.0
-        self._segments, self._rest = 0, np.empty(0)
+    def __init__(self, segment, window="hann", scaling="density"):
+        self.segment, self.window, self.scaling = segment, window, scaling
+        self._sum, self._segments, self._rest = np.zeros(segment // 2 + 1), 0, np.empty(0)
 
     def add(self, values):
         values = np.concatenate([self._rest, values])
         half = self.segment // 2
         count = len(values) // half - 1  # segments that are complete
         if count > 0:
-            found = spectra.welch(values[:(count + 1) * half], 1.0, self.window, self.segment, half)
-            self._sum = self._sum + found.values * found.segments
+            found = self._welch(values[:(count + 1) * half], 1.0)
+            self._sum += found.values * found.segments
             self._segments += found.segments
             self._rest = values[count * half:].copy()
         else:
             self._rest = values
 
+    def _welch(self, values, rate):
+        return spectra.welch(values, rate, self.window, self.segment, self.segment // 2, scaling=self.scaling)
+
     def result(self, rate):
-        """A spectra.Spectrum; the file has a segment at least."""
-        one = spectra.welch(np.zeros(self.segment), rate, self.window, self.segment)
-        return spectra.Spectrum(one.frequencies, self._sum / self._segments / rate, one.resolution, self._segments,
-                                "density")
+        """A spectra.Spectrum; there is a segment at least."""
+        one = self._welch(np.zeros(self.segment), rate)
+        mean = self._sum / self._segments
+        return spectra.Spectrum(one.frequencies, mean / rate if self.scaling == "density" else mean, one.resolution,
+                                self._segments, self.scaling)
 
 
 class Whole:
-    """Figures of all samples of a file. Of one that is not longer than `kept` samples only the outline
-    is made: the other sections have the samples."""
+    """All samples of a file. Of one that is not longer than `kept` samples only the outline is made: whoever
+    analyses it has the samples. Missing ones are gaps of the outline and left out of the figures, or filled in by
+    straight lines, as numpy.interp does it, where `fill` says so. `progress` is told of the samples of each block
+    that is read or passed; it does not go with a Whole to another process."""
 
-    def __init__(self, kept, outline=Envelope, progress=lambda samples: None):
-        self._progress = progress
-        self.kept, self.count, self.total, self.squares = kept, 0, 0.0, 0.0
-        self.envelope, self.histogram, self.spectrum = outline(), Histogram(), AveragedSpectrum()
+    def __init__(self, kept, outline=Envelope, progress=lambda samples: None, fill=False):
+        self.progress, self._fill = progress, fill
+        self.kept, self.rows = kept, 0  # rows of the file, those without a value included
+        self.envelope, self.moments = outline(), Moments()
         self._waiting = []  # until there are more than are kept
+        self._last, self._gap = None, 0  # the last value, and how many are missing behind it
+        self._file = None
 
     def add(self, values):
         if not len(values):
             return
-        self._progress(len(values))
-        self.count += len(values)
+        self.progress(len(values))
+        self.rows += len(values)
+        if self._fill:
+            values = self._filled(values)
+        self._take(values)
+
+    def finish(self):
+        """Takes the missing values at the end."""
+        if self._gap and self._last is not None:
+            self._take(np.full(self._gap, self._last))
+        self._gap = 0
+
+    def _take(self, values):
         self.envelope.add(values)
         self._waiting.append(values)
-        if self.count > self.kept:
+        if self.rows > self.kept and isinstance(self.envelope, Envelope):  # others keep all samples themselves
             for part in self._waiting:
                 self._sum_up(part)
             self._waiting = []
 
+    @property
+    def count(self):
+        """How many samples the figures have."""
+        return self.moments.count
+
     def _sum_up(self, values):
-        n = len(values)
-        self.total += n * stats.mean(values)
-        rms = stats.rms(values)
-        self.squares += n * (rms * rms)  # beyond all numbers perhaps, and no error
-        self.histogram.add(values)
-        self.spectrum.add(values)
+        values = values[~np.isnan(values)]
+        if len(values):
+            self.moments.add(values)
+            if self._file is None:
+                self._file = tempfile.TemporaryFile(buffering=0)
+            self._file.seek(0, 2)
+            self._file.write(np.ascontiguousarray(values, float))
 
     def __getstate__(self):
-        return {**self.__dict__, "_progress": None, "_waiting": []}
+        return {**self.__dict__, "progress": None, "_waiting": []}
 
-    @property
-    def mean(self):
-        return self.total / self.count
+    def _filled(self, values):
+        """The values without gaps, those of a gap that the part before ends with first; a gap at the end waits."""
+        at, before = np.flatnonzero(~np.isnan(values)), self._gap
+        if len(at) == len(values) and not before:
+            self._last = values[-1]
+            return values
+        if not len(at):
+            self._gap += len(values)
+            return values[:0]
+        known, ends = values[at], np.arange(-before, at[-1] + 1)
+        self._gap = len(values) - 1 - int(at[-1])
+        if self._last is not None:
+            at, known = np.r_[-before - 1, at], np.r_[self._last, known]
+        self._last = known[-1]
+        return np.interp(ends, at, known)
 
-    @property
-    def rms(self):
-        return (self.squares / self.count) ** 0.5
+    def part(self, first, count):
+        """Samples from one on, fewer at the end."""
+        self._file.seek(8 * first)
+        return np.fromfile(self._file, float, min(count, self.count - first))
+
+    def parts(self, hop=None, length=None):
+        """Blocks that begin `hop` samples apart, and are longer where `length` says so."""
+        hop = hop or BLOCK
+        for first in range(0, self.count, hop):
+            found = self.part(first, length or hop)
+            self.progress(min(hop, len(found)))
+            yield found
+
+    @functools.cached_property
+    def _counts(self):
+        low, high = self.moments.least, self.moments.greatest
+        counts = np.zeros(FINE, np.int64)
+        for part in self.parts():
+            counts += np.bincount(_places(part, low, high), minlength=FINE)
+        return counts
+
+    def histogram(self, bins):
+        """The counts of equal bins between the extremes, 120 of them or a divisor of that, and their centres."""
+        low, high = self.moments.least, self.moments.greatest
+        return (self._counts.reshape(bins, -1).sum(1), low + (np.arange(bins) + 0.5) * ((high - low) / bins))
+
+    @functools.cached_property
+    def median(self):
+        upper = self._of_rank(self.count // 2)
+        return upper if self.count % 2 else (upper + self._of_rank(self.count // 2 - 1)) / 2
+
+    def _of_rank(self, rank):
+        """The sample that `rank` others are not above."""
+        low, high, counts = self.moments.least, self.moments.greatest, self._counts
+        while low < high:
+            below = np.cumsum(counts)
+            at = int(np.searchsorted(below, rank, "right"))
+            rank -= int(below[at] - counts[at])
+            chosen, inside = [], Moments()
+            for part in self.parts():
+                part = part[(part >= low) & (part <= high)]
+                part = part[_places(part, low, high) == at]
+                if counts[at] <= SELECTED:
+                    chosen.append(part)
+                elif len(part):
+                    inside.least = min(inside.least, float(part.min()))
+                    inside.greatest = max(inside.greatest, float(part.max()))
+            if counts[at] <= SELECTED:
+                return float(np.partition(np.concatenate(chosen), rank)[rank])
+            low, high = inside.least, inside.greatest
+            counts = np.zeros(FINE, np.int64)
+            for part in self.parts():
+                part = part[(part >= low) & (part <= high)]
+                counts += np.bincount(_places(part, low, high), minlength=FINE)
+        return low
+
+    def spectrum(self, rate, segment, window="hann", scaling="density"):
+        found = AveragedSpectrum(segment, window, scaling)
+        for part in self.parts():
+            found.add(part)
+        return found.result(rate)
+
+
+def _places(values, low, high):
+    """The bins of values, of FINE between two limits; the last one has the upper limit."""
+    if not low < high:
+        return np.full(len(values), FINE - 1)
+    return np.minimum((values - low) * (FINE / (high - low)), FINE - 1).astype(np.int64)

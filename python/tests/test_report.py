@@ -174,9 +174,9 @@ class Reading(InFolder):
                 read = self.read(text, start=150)
                 self.assertEqual(read.values.tolist(), [i % 7 for i in range(150, 350)])
                 self.assertIn("samples 151 to 350 of 999", read.choice)
-                everything = np.array([i % 7 for i in range(1000) if i != 700])
-                self.assertAlmostEqual(read.whole.mean, everything.mean(), delta=1e-12)
-                self.assertAlmostEqual(read.whole.rms, np.sqrt(np.mean(everything**2)), delta=1e-12)
+                rest = np.array([i % 7 for i in range(1000) if i != 700])[150:]
+                self.assertAlmostEqual(read.whole.moments.mean, rest.mean(), delta=1e-12)
+                self.assertAlmostEqual(read.whole.moments.rms, np.sqrt(np.mean(rest**2)), delta=1e-12)
                 samples = [struct.pack("<h", v) for v in range(500)]
                 read = self.read(wav(samples), "a.wav", start=250)
                 self.assertEqual((32768 * read.values).tolist(), [*range(250, 450)])
@@ -184,25 +184,31 @@ class Reading(InFolder):
                 with mock.patch.object(audio, "FRAMES_AT_ONCE", 90):
                     section = sections_recording.overview(self.read(wav(samples), "a.wav"))
                 self.assertEqual((32768 * section.figures[0].curves[0].values).tolist(), [*range(500)])
-                self.assertEqual({row.label: row.value for row in section.rows}["Samples in the file"], "500")
+                self.assertTrue(section.text.startswith("500 samples"))
             self.assertIn("without the first 150 samples", self.read(text, start=150).choice)
 
     def test_a_file_of_any_length_has_the_figures_of_all_its_samples(self):
         rng = np.random.default_rng(3)
-        x = np.r_[rng.normal(size=3000), 8 + rng.normal(size=2000), np.sin(np.arange(4000))]
-        whole = wholes.Whole(1000)
-        whole.spectrum = wholes.AveragedSpectrum(256)
-        for part in np.split(x, [700, 701, 5000]):
-            whole.add(part)
-        expected = qx.spectra.welch(x, 10.0, nperseg=256)
-        found = whole.spectrum.result(10.0)
-        np.testing.assert_allclose(found.values, expected.values, rtol=1e-12)
-        self.assertEqual((found.segments, found.resolution), (expected.segments, expected.resolution))
-        counts, first, width = whole.histogram.shown(100)
-        self.assertEqual(counts.sum(), len(x))
-        edges = first + width * (np.arange(len(counts) + 1) - 0.5)
-        self.assertLess(np.abs(counts - np.histogram(x, edges)[0]).max(), 3)  # a value on an edge
-        self.assertAlmostEqual(whole.histogram.median(), np.median(x), delta=0.02)
+        mixed = np.r_[rng.normal(size=3000), 8 + rng.normal(size=2000), np.sin(np.arange(4000))]
+        for name, x in (("mixed", mixed), ("coarse", np.round(2 * mixed)), ("one value", np.full(9001, 7.0)),
+                        ("far away", 1e9 + mixed[:8999])):
+            for at_once in (20, 1 << 20):
+                with self.subTest(name, at_once=at_once), mock.patch.object(wholes, "SELECTED", at_once):
+                    whole = wholes.Whole(1000)
+                    for part in np.split(x, [700, 701, 5000]):
+                        whole.add(part)
+                    whole.finish()
+                    self.assertEqual(whole.median, np.median(x))
+                    self.assertEqual(whole.histogram(12)[0].tolist(), qx.stats.histogram(x, 12).counts.tolist())
+                    exact = x.astype(np.longdouble)
+                    np.testing.assert_allclose(
+                        [whole.moments.mean, whole.moments.rms, *map(whole.moments.moment, (2, 3, 4))],
+                        [exact.mean(), np.sqrt(np.mean(exact**2)), *(np.mean((exact - exact.mean())**order)
+                                                                     for order in (2, 3, 4))], rtol=1e-11)
+                    found, expected = whole.spectrum(10.0, 256), qx.spectra.welch(x, 10.0, nperseg=256)
+                    np.testing.assert_allclose(found.values, expected.values, rtol=1e-10, atol=1e-300)
+                    self.assertEqual((found.segments, found.resolution), (expected.segments, expected.resolution))
+        x = mixed
         outline = wholes.Envelope(64)
         for part in np.split(x, [3, 3, 4000, 8999]):
             outline.add(part)
@@ -211,6 +217,44 @@ class Reading(InFolder):
         starts = np.arange(0, len(x), outline.samples)
         np.testing.assert_array_equal(lows, np.minimum.reduceat(x, starts))
         np.testing.assert_array_equal(highs, np.maximum.reduceat(x, starts))
+
+    def test_missing_values_keep_their_places(self):
+        x = np.sin(np.arange(999.0))
+        gaps = np.isin(np.arange(999), [0, 1, 300, 700, 701, 702, 997, 998])
+        text = "time (s),u\n" + "".join(f"{i / 100},{'' if gone else repr(value)}\n" for i, (value, gone) in enumerate(
+            zip(x.tolist(), gaps)))
+        filled = np.interp(np.arange(999), np.flatnonzero(~gaps), x[~gaps])
+        for kept in (200, 2000):
+            for lines in (10, 301, 2000):
+                with mock.patch.object(recording, "MOST_SAMPLES", kept), mock.patch.object(tables, "LINES_AT_ONCE", lines):
+                    for missing, values, outline in (("skip", x[~gaps], np.where(gaps, np.nan, x)),
+                                                     ("interpolate", filled, filled)):
+                        read = self.read(text, missing=missing)
+                        np.testing.assert_allclose(read.envelope.bounds()[0], outline, rtol=1e-12)
+                        self.assertEqual(read.row_rate or read.rate, 100)
+                        if read.whole:
+                            np.testing.assert_allclose(read.whole.part(0, 999), values, rtol=1e-12)
+                        else:
+                            np.testing.assert_allclose(read.values, values, rtol=1e-12)
+
+    def test_a_report_on_a_long_file_is_that_on_all_its_samples(self):
+        t = np.arange(30_000) / 1000
+        rng = np.random.default_rng(5)
+        x = np.where(t < 20, 0.1, 0.4) * np.sin(2 * np.pi * 50.5 * t) + 0.01 * rng.normal(size=len(t))
+        soundfile.write(self.folder / "a.wav", x, 1000, "DOUBLE")
+        sections_ = [sections_recording.overview, sections_recording.statistics, sections_recording.histogram,
+                     sections_spectra.power, sections_spectra.over_time]
+        with mock.patch.object(report, "SECTIONS", sections_), mock.patch.object(sections_spectra, "LONGEST", 1024):
+            expected = report.sections_of(recording.read(self.folder / "a.wav"))
+            with mock.patch.object(recording, "MOST_SAMPLES", 7000), mock.patch.object(wholes, "BLOCK", 4001):
+                found = report.sections_of(recording.read(self.folder / "a.wav"))
+        for one, other in zip(found, expected, strict=True):
+            self.assertEqual([(row.label, row.value) for row in one.rows if "Mode" not in row.label],
+                             [(row.label, row.value) for row in other.rows if "Mode" not in row.label])
+            self.assertEqual(one.text.split(" samples")[0] if one is found[0] else one.title,
+                             other.text.split(" samples")[0] if one is found[0] else other.title)
+            for plot, alike in zip(one.figures, other.figures):
+                self.assertEqual(plot.x_label, alike.x_label)
 
     def test_all_channels_are_there(self):
         read = self.read("time,a [V],word,b\n0,1,x,5\n1,2,y,\n2,3,z,7\n")

@@ -8,12 +8,13 @@ import sys
 import tempfile
 import unittest
 from pathlib import Path
+from unittest import mock
 
 import numpy as np
 
 sys.path.insert(0, str(Path(__file__).resolve().parent.parent))
 import qx  # noqa: E402
-from qx import __main__ as command, tones  # noqa: E402
+from qx import __main__ as command, long_tones, recording, tones, wholes  # noqa: E402
 
 RATE = 1000.0
 T = np.arange(4000) / RATE
@@ -26,6 +27,45 @@ class Topic(unittest.TestCase):
         np.testing.assert_allclose(found.frequencies, [50, 83.3, 150], rtol=1e-9)
         np.testing.assert_allclose(found.amplitudes, [2, 0.1, 0.02], rtol=1e-9)
         self.assertTrue(found.significant.all())
+
+    def test_of_a_long_recording_the_whole_resolves_what_a_part_does_not(self):
+        rng, n = np.random.default_rng(7), 100_000
+        t, x = np.arange(n), 1e-3 * rng.normal(size=n) + 3
+        expected = np.array([(0.0501, 1.0, 0.3), (0.0501 + 3.3 / n, 0.5, 1.0), (0.2, 0.05, -2.0), (0.4999, 0.3, 2.0),
+                             (32.5 / n, 0.2, -1.0)])
+        for frequency, amplitude, phase in expected:
+            x += amplitude * np.cos(2 * np.pi * frequency * t + phase)
+        with mock.patch.multiple(long_tones, SEGMENT=4096, BLOCK=4096, MOST_KEPT=12_000, NARROWEST=64):
+            whole = wholes.Whole(10)
+            for part in np.array_split(x, 7):
+                whole.add(part)
+            found = long_tones.measured(whole, 10.0, 5)
+            residual = long_tones.residual_rms(whole, found, 10.0)
+            _, amplitudes, _ = long_tones.spectrum(whole, 10.0)
+        for frequency, amplitude, phase in expected:
+            i = np.argmin(np.abs(found.frequencies - 10 * frequency))
+            self.assertLess(abs(found.frequencies[i] - 10 * frequency), 5 * found.frequency_errors[i])
+            self.assertLess(abs(found.amplitudes[i] - amplitude), 5 * found.amplitude_errors[i])
+            self.assertAlmostEqual(found.phases[i], phase, delta=0.01)
+        self.assertLess(found.frequency_errors.max() * n / 10, 0.01)  # of the resolution
+        self.assertAlmostEqual(residual, 1e-3, delta=2e-5)
+        self.assertAlmostEqual(amplitudes[round(0.2 * 4096)], 0.05, delta=0.005)
+
+    def test_harmonics_of_a_long_recording_are_means_of_powers(self):
+        n = 40_000
+        t = np.arange(n) / RATE
+        x = np.cos(2 * np.pi * 50.05 * t) + 0.01 * np.cos(2 * np.pi * 100.1 * t) + np.random.default_rng(
+            1).normal(size=n) * np.where(t < 20, 1e-3, 3e-3)
+        with mock.patch.object(long_tones, "SEGMENT", 4000):
+            whole = wholes.Whole(10)
+            whole.add(x)
+            found = long_tones.harmonics(whole, RATE, 50.05, 3, 2.0)
+        expected = qx.measure.harmonics(x, RATE, 50.05, 3, 2.0)
+        for name, near in (("thd", 1e-5), ("sinad", 0.1), ("snr", 0.1), ("enob", 0.02)):
+            self.assertAlmostEqual(getattr(found, name), getattr(expected, name), delta=near)
+        self.assertAlmostEqual(found.snr, 10 * np.log10(0.5 / 5e-6), delta=0.2)
+        self.assertAlmostEqual(found.noise_floor, expected.noise_floor + 10, delta=0.2)  # bins ten times as wide
+        np.testing.assert_allclose(found.amplitudes[:2], expected.amplitudes[:2], atol=1e-4)
 
     def test_uncertainties_are_the_scatter_of_the_estimates(self):
         rng, n = np.random.default_rng(2), 1000

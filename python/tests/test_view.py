@@ -16,7 +16,7 @@ import numpy as np
 
 PYTHON = Path(__file__).resolve().parent.parent
 sys.path.insert(0, str(PYTHON))
-from qx import many, recording, report, serving, viewing  # noqa: E402
+from qx import design, design_page, many, recording, report, serving, viewing  # noqa: E402
 
 ECG = PYTHON.parent / "examples/data/ecg_208_360hz.csv"
 PICTURE = PYTHON.parent / "docs/page.png"
@@ -130,6 +130,21 @@ class Server(InFolder):
             np.testing.assert_array_equal(lows, np.minimum.reduceat(x[:start + group * len(lows)], starts))
             if highs is not None:
                 np.testing.assert_array_equal(highs, np.maximum.reduceat(x[:start + group * len(lows)], starts))
+
+    def test_missing_values_are_gaps_at_their_times(self):
+        path = self.folder / "gaps.csv"
+        path.write_text("time (s),u\n" + "".join(f"{i / 100},{'' if i % 7 == 3 or 500 <= i < 700 else i % 5}\n"
+                                                 for i in range(2000)))
+        served = self.served(path, missing="skip")
+        _, found = served.ask("sections", **{"from": 8, "to": 15})
+        self.assertIn("from 8 to 15 s", found["html"])
+        self.assertIn("missing values are left out of statistics and histogram", found["html"])
+        image = next(plot["image"] for plot in found["plots"] if "image" in plot)
+        self.assertAlmostEqual(image["right"], 15, delta=0.02)
+        levels = served.opened[0].channels[0][2]
+        np.testing.assert_array_equal(np.isnan(levels.values), [i % 7 == 3 or 500 <= i < 700 for i in range(2000)])
+        seen = served.ask("data", version=1, **{"from": 0, "to": 20, "points": 5000})[1]
+        self.assertAlmostEqual(seen["step"], 0.01)
 
     def test_sections_are_those_of_the_part_the_channel_and_the_filter(self):
         t = np.arange(20_000) / 1000
@@ -249,12 +264,30 @@ class InABrowser(InFolder):
         self.assertTrue(self.until("return figures.some(one => one.log && one.graph.xAxisRange()[0] > 0)"))
         self.no_complaints()
 
+    def test_values_of_a_design_are_seen_and_labels_of_marks_lie_apart(self):
+        path = self.folder / "design.html"
+        design_page.write(design.equiripple("lowpass", [100.0, 150.0], 1000.0, 101), "Equiripple lowpass", 1000.0, path)
+        self.show(path.as_uri(), 390)
+        self.assertTrue(self.browser.execute_script(
+            "return [...document.querySelectorAll('section:first-of-type td.value')].every("
+            "one => one.getBoundingClientRect().right <= 390)"))
+        self.show(self.page())
+        self.assertTrue(self.browser.execute_script("""
+            const taken = [], canvas = document.createElement("canvas").getContext("2d");
+            canvas.font = "11px sans-serif";
+            for (let i = 0; i < 6; i++) label(canvas, {x: 0, y: 0, w: 300, h: 200}, taken, "90%", 100 + i, 100);
+            return taken.length > 1 && taken.length < 6 && taken.every(([x, y, w], i) => taken.every(([a, b, v], k) =>
+              i === k || x >= a + v || a >= x + w || Math.abs(y - b) >= 13));"""))
+        self.no_complaints()
+
     def test_the_index_sorts(self):
-        found = [many.Outcome(f"{name}.csv", cells=(count, "1", *["" for _ in many.MAIN]))
+        found = [many.Outcome(f"{name}.csv", cells=(count, "1", *["-1.23456e-05 ± 1.2e-08 mV" for _ in many.MAIN[:4]], "1"))
                  for name, count in (("b", "9"), ("a", "100"), ("c", "20"))]
         path = self.folder / "index.html"
         path.write_text(many.index(found), "utf-8")
         self.show(path.as_uri())
+        self.assertTrue(self.browser.execute_script("const wide = document.querySelector('div.wide');"
+                                                    "return wide.scrollWidth <= wide.clientWidth"))
         buttons = self.browser.find_elements("css selector", "th button")
         names = "return [...document.querySelectorAll('td a')].map(one => one.textContent).join()"
         for column, expected in ((1, "b.csv,c.csv,a.csv"), (1, "a.csv,c.csv,b.csv"), (0, "a.csv,b.csv,c.csv")):

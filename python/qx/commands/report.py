@@ -6,7 +6,7 @@ import sys
 
 from ..outputs import add_force
 from . import reading as reading_options
-from .values import add_command
+from .values import add_command, bar
 
 EXAMPLES = """\
 examples:
@@ -28,15 +28,13 @@ def report_on(options):
         return report_on_many(options, reading)
     from .. import isolation
     isolation.prepare()  # while this process loads what comes after reading
-    import tqdm
-
     from .. import outputs, recording, report
     path = os.path.join(options.output, "report.html")
     outputs.check(path, options.force, "report", outputs.identities(options.files))
-    # A file that is read within a second needs no bar.
-    with tqdm.tqdm(unit=" samples", unit_scale=True, delay=1, leave=False, disable=not sys.stderr.isatty()) as bar:
-        read = recording.read(options.files[0], **reading, progress=bar.update)
-    for line in report.write(read, path):
+    with bar() as shown:
+        read = recording.read(options.files[0], **reading, progress=shown.update)
+        lines = report.write(read, path)  # long recordings are passed several times
+    for line in lines:
         print(line)
     print(f"\nThe report with plots: {path}")
 
@@ -46,21 +44,21 @@ def report_on_many(options, reading):
 
     from .. import many
     from ..files import printable
-    bar = tqdm.tqdm(unit=" recordings", disable=not sys.stderr.isatty())
+    shown = tqdm.tqdm(unit=" recordings", disable=not sys.stderr.isatty())
 
     def tell(outcome):
         if outcome.failure:
-            bar.write(f"qx: {outcome.failure}", file=sys.stderr)
-        bar.update()
+            shown.write(f"qx: {outcome.failure}", file=sys.stderr)
+        shown.update()
 
     try:
         found = many.write([os.fspath(path) for path in options.files], options.output, reading,
-                           options.workers, options.scheduler, tell, bar.reset, options.force)
+                           options.workers, options.scheduler, tell, shown.reset, options.force)
     except BaseException:
-        bar.leave = False
+        shown.leave = False
         raise
     finally:
-        bar.close()
+        shown.close()
     read = sum(not outcome.failure for outcome in found)
     print(f"{read} of {len(found)} recordings were read: {os.path.join(options.output, 'index.html')}")
     if left := many.left_out(options.files):

@@ -5,7 +5,7 @@ import os
 from ..outputs import add_force
 from . import reading
 from .measure import number, show_table, show_texts, write_table
-from .values import add_command, positive
+from .values import add_command, bar, positive
 
 EXAMPLES = """\
 examples:
@@ -19,7 +19,7 @@ IEEE 1241. A drawing of an earlier run (SVG) is replaced; other files of that na
 
 
 def tones(options):
-    from .. import drawing, measure, outputs, recording
+    from .. import drawing, long_tones, measure, outputs, recording
     from .. import tones as topic
     from ..sections import uncertain
     path = options.plot or os.path.join("out", "tones.svg")
@@ -27,12 +27,23 @@ def tones(options):
     outputs.check(path, options.force, "tones", inputs)
     if options.csv:
         outputs.check(options.csv, options.force, inputs=inputs)
-    read = recording.read(options.file, **reading.of(options))
-    print(f"{read.name}: {read.choice}")
-    rate = read.rate or 1.0
-    found = topic.tones(read.values, rate, options.count)
-    analysis = measure.harmonics(read.values, rate, options.fundamental, options.harmonics, options.full_scale)
-
+    with bar() as shown:
+        read = recording.read(options.file, **reading.of(options), progress=shown.update)
+        print(f"{read.name}: {read.choice}")
+        rate = read.rate or 1.0
+        if read.whole:
+            found = long_tones.measured(read.whole, rate, options.count)
+            found.residual_rms = long_tones.residual_rms(read.whole, found, rate)
+            analysis = long_tones.harmonics(read.whole, rate, options.fundamental or found.frequencies[0],
+                                            options.harmonics, options.full_scale)
+            drawn = long_tones.spectrum(read.whole, rate)
+            print(f"Tones of all {read.whole.count} samples; spectrum and harmonics are means over parts of "
+                  f"{long_tones.SEGMENT} samples")
+        else:
+            found = topic.tones(read.values, rate, options.count)
+            analysis = measure.harmonics(read.values, rate, options.fundamental, options.harmonics,
+                                         options.full_scale)
+            drawn = topic.spectrum(read.values, rate)
     frequency = "frequency (Hz)" if read.rate else "frequency (1/sample)"
     amplitude = f"amplitude ({read.unit})" if read.unit else "amplitude"
     names = [frequency, amplitude, "phase (rad)"]
@@ -59,7 +70,7 @@ def tones(options):
         write_table(options.csv, ["kind", "number", names[0], names[1], names[2], *errors],
                     [("tone", i, row[0], row[2], row[4], row[1], row[3]) for i, row in enumerate(columns, 1)]
                     + [("harmonic", *row, "", "") for row in rows])
-    drawing.save([topic.plot(read, found, analysis)], path, "tones")
+    drawing.save([topic.plot(read, found, analysis, drawn)], path, "tones")
     print(f"Spectrum with tones and harmonics: {path}")
 
 

@@ -1,6 +1,7 @@
 """What the parsers and options of several commands share."""
 
 import argparse
+import sys
 
 
 def positive(text):
@@ -16,3 +17,9 @@ def add_command(commands, name, examples, **texts):
     texts.setdefault("description", texts["help"][:1].upper() + texts["help"][1:] + ".")
     return commands.add_parser(name, epilog=examples,
                                formatter_class=argparse.RawDescriptionHelpFormatter, **texts)
+
+
+def bar():
+    """A bar of samples on a terminal, behind which nothing stays; what is done within a second needs none."""
+    import tqdm
+    return tqdm.tqdm(unit=" samples", unit_scale=True, delay=1, leave=False, disable=not sys.stderr.isatty())
