@@ -105,10 +105,10 @@ NEWEST = {
         "cholesky": "FullCholesky_head", "cholesky_complex": "CxFullCholesky_head", "schur":
         "Schur80_head", "schur_complex": "CxSchur80_head", "qz": "QZ80_head", "qz_complex":
         "CxQZ80_head", "hessenberg": "Hessenberg_head", "hessenberg_complex": "CxHessenberg_head",
-        "expm": "MatrixExp2026_head", "expm_complex": "CxMatrixExp2026_head", "logm": "MatrixLn_head",
-        "logm_complex": "CxMatrixLn_head", "sqrtm": "MatrixSqrtH", "sqrtm_complex":
-        "CxMatrixSqrt_head", "matrix_power": "MatrixPower_head", "matrix_power_complex":
-        "CxMatrixPower_head", "solve_sylvester": "Sylvester2011_head", "solve_sylvester_complex":
+        "expm": "MatrixExp2026_head", "expm_complex": "CxMatrixExp2026_head", "logm":
+        "MatrixLn2026_head", "logm_complex": "CxMatrixLn2026_head", "sqrtm": "MatrixSqrt2026_head",
+        "sqrtm_complex": "CxMatrixSqrt2026_head", "matrix_power": "MatrixPower2026_head",
+        "matrix_power_complex": "CxMatrixPower2026_head", "solve_sylvester": "Sylvester2011_head", "solve_sylvester_complex":
         "CxSylvester2011_head", "solve_lyapunov": "Lyapunov2011_head", "solve_lyapunov_complex":
         "CxLyapunov2011_head", "solve_banded": "BandEqsDriH", "solve_banded_complex":
         "CxBandEqsDriH", "solve_banded_many": "BandEqsSetDriH", "solve_banded_many_complex":

@@ -338,6 +338,25 @@ std::vector<Refuser<E>> Properties() {
              return Twin<E>(MatrixExp2026_head, CxMatrixExp2026_head)(a.handle(), out.handle());
          },
          LargestIsFine},
+        {"MatrixLn2026",
+         [](M a, M) {
+             CDB2DArray out;
+             return Twin<E>(MatrixLn2026_head, CxMatrixLn2026_head)(a.handle(), out.handle());
+         },
+         LargestIsFine},
+        {"MatrixSqrt2026",
+         [](M a, M) {
+             CDB2DArray out;
+             return Twin<E>(MatrixSqrt2026_head, CxMatrixSqrt2026_head)(a.handle(), out.handle());
+         },
+         LargestIsFine},
+        {"MatrixPower2026",
+         [](M a, M) {
+             M out;
+             return Twin<E>(MatrixPower2026_head, CxMatrixPower2026_head)(a.handle(), 0,
+                                                                          out.handle());
+         },
+         LargestIsFine},
         {"MatrixPower -1",
          [](M a, M) { return Twin<E>(MatrixPower_head, CxMatrixPower_head)(a.handle(), -1); }},
         {"Rank",
