@@ -50,7 +50,7 @@ OTHERS = (
     ("*SVDS_head", "linalg.svdvals"), ("*MatrixExp_head", "linalg.expm"), ("*PseudoInverse_head", "linalg.pinv"),
     ("Norm_head CxNorm_head", "linalg.norm"),
     ("*CondNumber_head", "linalg.cond"), ("Rank_head CxRank_head", "linalg.matrix_rank"),
-    ("TriDiag*", "linalg.solve_banded"), ("*Schur_head", "linalg.schur"), ("*QZ_head", "linalg.qz"),
+    ("TriDiag*", "linalg.solve_banded"), ("*Schur_head Schur80_head", "linalg.schur"), ("*QZ_head", "linalg.qz"),
     ("MatrixSqrt* CxMatrixSqrt_head", "linalg.sqrtm"), ("*MatrixLn_head", "linalg.logm"),
     ("*MatrixPower_head", "linalg.matrix_power"), ("*Sylvester_head", "linalg.solve_sylvester"),
     ("*Lyapunov_head", "linalg.solve_lyapunov"), ("*nitVector*", "x / linalg.norm(x)"),

@@ -132,8 +132,8 @@ QX_API ErrorCode CxMatrixSqrt2026_head(QX_IN CDB2D a, QX_OUT CDB2D out);
 /** a^power in place of the square matrix a, by repeated squaring. Power 0 gives the identity; a
     negative power is one of the pseudo-inverse, so a singular matrix is no failure, and digits are
     lost where the norm of a is below 1 (PseudoInverse_head): the cube of the inverse of a matrix with
-    condition number 1000 has a relative error of 2e-6 for elements of 1e-8, and no digit for elements
-    of 1e-12. MatrixPower2026_head keeps the digits. Elements that overflow, and what is computed from
+    condition number 1000 can have a relative error of 2e-6 for elements of 1e-8, and has no digit at
+    1e-12. MatrixPower2026_head keeps the digits. Elements that overflow, and what is computed from
     them, are infinite or NaN.
     Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory),
     ErrNonFiniteInput (power is negative and an element not finite), ErrIterationLimit (the singular

@@ -457,6 +457,10 @@ def CxSchur80_head(a: ArrayLike, wantVectors: int, order: int) -> tuple[NDArray[
     """As Schur80_head, for complex elements: a = u t u^H with a triangular t. Schur form a = u t u^T ..."""
 
 
+def Schur2026_head(a: ArrayLike, wantVectors: int, order: int) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.complex128]]:
+    """As Schur80_head, with eigenvalues that are in order as w has them: blocks are sorted, by up to ..."""
+
+
 def create_oxfft_table(length: int) -> Pointer:
     """The plan for transforms of `length` values, built at the first request and shared after it."""
 

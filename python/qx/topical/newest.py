@@ -103,7 +103,7 @@ NEWEST = {
         "SymEvectorEvalue_head", "svd": "SVD2026_head", "svd_complex": "CxSVD2026_head", "svdvals":
         "SVDS2026_head", "svdvals_complex": "CxSVDS2026_head", "qr": "QRDecH", "qr_complex": "CxQRDecH",
         "cholesky": "FullCholesky_head", "cholesky_complex": "CxFullCholesky_head", "schur":
-        "Schur80_head", "schur_complex": "CxSchur80_head", "qz": "QZ80_head", "qz_complex":
+        "Schur2026_head", "schur_complex": "CxSchur80_head", "qz": "QZ80_head", "qz_complex":
         "CxQZ80_head", "hessenberg": "Hessenberg_head", "hessenberg_complex": "CxHessenberg_head",
         "expm": "MatrixExp2026_head", "expm_complex": "CxMatrixExp2026_head", "logm":
         "MatrixLn2026_head", "logm_complex": "CxMatrixLn2026_head", "sqrtm": "MatrixSqrt2026_head",

@@ -439,6 +439,13 @@ std::vector<Refuser<ElementType::DBL>> RealOnly() {
              return GenLinEqs2010_head(a.handle(), right.handle(), x.handle(), -1.0, work.handle());
          },
          RightSide | Rectangular},
+        {"Schur2026",
+         [](M a, M) {
+             M u;
+             CDBArray w;
+             return Schur2026_head(a.handle(), 1, 1, u.handle(), w.handle());
+         },
+         LargestIsFine},
         {"GenLinEqsbySVD2011",
          [](M a, M b) {
              DBLArray x, work, right = Elements(b);
