@@ -108,9 +108,9 @@ NEWEST = {
         "expm": "MatrixExp2026_head", "expm_complex": "CxMatrixExp2026_head", "logm":
         "MatrixLn2026_head", "logm_complex": "CxMatrixLn2026_head", "sqrtm": "MatrixSqrt2026_head",
         "sqrtm_complex": "CxMatrixSqrt2026_head", "matrix_power": "MatrixPower2026_head",
-        "matrix_power_complex": "CxMatrixPower2026_head", "solve_sylvester": "Sylvester2011_head", "solve_sylvester_complex":
-        "CxSylvester2011_head", "solve_lyapunov": "Lyapunov2011_head", "solve_lyapunov_complex":
-        "CxLyapunov2011_head", "solve_banded": "BandEqsDriH", "solve_banded_complex":
+        "matrix_power_complex": "CxMatrixPower2026_head", "solve_sylvester": "Sylvester2011_head",
+        "solve_sylvester_complex": "CxSylvester2011_head", "solve_lyapunov": "Lyapunov2011_head",
+        "solve_lyapunov_complex": "CxLyapunov2011_head", "solve_banded": "BandEqsDriH", "solve_banded_complex":
         "CxBandEqsDriH", "solve_banded_many": "BandEqsSetDriH", "solve_banded_many_complex":
         "CxBandEqsSetDriH", "charpoly": "MatrixCharacteristicPoly_head", "charpoly_complex":
         "CxMatrixCharacteristicPoly_head", "is_positive_definite": "CheckPosdef_head",

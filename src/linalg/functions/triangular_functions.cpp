@@ -197,7 +197,7 @@ private:
     bool bringDiagonalNear() {
         int32_t needed = 0;
         for (int32_t i = 0; i < n_; ++i)
-            while (Modulus(ExpMinusOne(TimesPower(logarithms_[i], -needed))) > Theta(highestDegree))
+            while (needed < mostRoots && !isNear(TimesPower(logarithms_[i], -needed)))
                 ++needed;
         while (roots_ < needed)
             if (!takeRoot())
@@ -205,11 +205,16 @@ private:
         return true;
     }
 
+    static bool isNear(Value logarithm) {
+        return Modulus(ExpMinusOne(logarithm)) <= Theta(highestDegree);
+    }
+
     // More roots until an approximant serves, whose degree is set.
     bool chooseDegree() {
+        const double second = rootOfNorm(2);
         double third = rootOfNorm(3);
         for (degree_ = 1; degree_ <= 2; ++degree_)
-            if (std::max(rootOfNorm(2), third) <= Theta(degree_))
+            if (std::max(second, third) <= Theta(degree_))
                 return true;
         for (int32_t extra = 0;;) {
             const double fourth = rootOfNorm(4), lower = std::max(third, fourth);

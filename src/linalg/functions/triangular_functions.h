@@ -11,8 +11,8 @@ namespace qx {
 // r r = t, column by column up to a small order, and beyond it by halves, whose block beside them
 // solves a triangular equation (A. Bjorck and S. Hammarling, "A Schur method for the square root of
 // a matrix", 1983; by halves E. Deadman, N. J. Higham and R. Ralha, "Blocked Schur algorithms for
-// computing the matrix square root", 2012). What rounding errors in t, at most
-// `negligible`, leave beside diagonal elements that are no larger counts as 0.
+// computing the matrix square root", 2012). What rounding errors in t, at most `negligible`, leave
+// beside diagonal elements that are no larger counts as 0.
 // ErrOutOfMemory; ErrDegenerateValue (there is no root, or its elements overflow).
 template <ElementType E>
 ErrorCode SquareRootOfTriangle(const MatrixView<E> &t, double negligible);
