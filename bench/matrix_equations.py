@@ -1,4 +1,4 @@
-"""Sylvester and Lyapunov equations and the matrix exponential against SciPy, in one process.
+"""Sylvester and Lyapunov equations and functions of matrices against SciPy, in one process.
 
 Ours is the export through the binding. SciPy's speed depends on the BLAS that it finds; the first
 line names it.
@@ -83,6 +83,23 @@ def exponential_cases():
             yield (f"{kind}, n {n}", lambda: qx.call(prefix + "MatrixExp2026_head", a), lambda: linalg.expm(a))
 
 
+def function_cases(export, peer, of_elder=None):
+    """Against the peer, or against the elder export where one is given."""
+    for kind, prefix in (("real", ""), ("complex", "Cx")):
+        for n in ORDERS:
+            a, = matrices(kind, n, 1)
+            other = (lambda: qx.call(of_elder[kind], a)) if of_elder else (lambda: peer(a))
+            yield f"{kind}, n {n}", lambda: qx.call(prefix + export, a), other
+
+
+def power_cases():
+    for kind, prefix in (("real", ""), ("complex", "Cx")):
+        for n in ORDERS:
+            a, = matrices(kind, n, 1)
+            yield (f"{kind}, n {n}", lambda: qx.call(prefix + "MatrixPower2026_head", a, -3),
+                   lambda: np.linalg.matrix_power(a, -3))
+
+
 def blas_of_scipy():
     maps = Path("/proc/self/maps").read_text().split()
     return ", ".join(sorted({word for word in maps if re.match("lib.*blas", Path(word).name)}))
@@ -94,3 +111,9 @@ if __name__ == "__main__":
     compare("continuous Lyapunov equations", "SciPy", continuous_cases())
     compare("discrete Lyapunov equations", "SciPy", discrete_cases())
     compare("matrix exponentials, revision", "SciPy", exponential_cases())
+    compare("matrix logarithms, revision", "SciPy",
+            function_cases("MatrixLn2026_head", lambda a: linalg.logm(a, disp=False)))
+    compare("matrix square roots, revision", "SciPy", function_cases("MatrixSqrt2026_head", linalg.sqrtm))
+    compare("matrix square roots, revision", "elder",
+            function_cases("MatrixSqrt2026_head", None, {"real": "MatrixSqrtH", "complex": "CxMatrixSqrt_head"}))
+    compare("matrix powers of -3, revision", "NumPy", power_cases())

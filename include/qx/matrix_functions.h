@@ -49,7 +49,8 @@ QX_API ErrorCode CxMatrixExp2026_head(QX_IN CDB2D a, QX_OUT CDB2D out);
     MatrixExp_head, whose own error limits what refinement can tell: the error can reach 4e-8, while
     exp(log(a)) gives a back. log |z| is half the logarithm of |z|^2, so an element of a diagonal
     matrix, or an eigenvalue, above 1e154 in modulus has an infinite one, and one below 1e-162
-    counts as zero.
+    counts as zero. Of negative eigenvalues rounding decides between +i pi and -i pi; all digits are
+    lost where it chooses the second. MatrixLn2026_head loses neither.
     Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory),
     ErrNonFiniteInput (an element, or the result, is not finite), ErrDegenerateValue (a has a zero
     eigenvalue, or square roots did not come near the identity), ErrSingularMatrix (an exponential
@@ -62,11 +63,37 @@ QX_API int32_t MatrixLn_head(QX_IN DBL2D a, QX_OUT CDB2D out, QX_OUT ErrorCode *
 /** As MatrixLn_head, for complex elements and in place. */
 QX_API int32_t CxMatrixLn_head(QX_INOUT CDB2D a, QX_OUT ErrorCode *err);
 
+/** The principal logarithm of the square matrix a, whose exponential is a and whose eigenvalues have
+    imaginary parts above -pi and up to pi. Through the Schur form, square roots of the triangle and a
+    Pade approximant of degree up to 7 in partial fractions, whose backward error is below 1.1e-16; of
+    a diagonal matrix element by element. Elements may be of any size. A real negative eigenvalue of a
+    real matrix (or of a complex one without imaginary parts) has the logarithm with +i pi; in a
+    complex matrix, unless it is triangular, an eigenvalue counts as negative where its imaginary part
+    is within n 2.2e-16 times the Frobenius norm of a below 0. Where a is real and has no negative
+    eigenvalue, imaginary parts are 0. Errors grow with the condition of the logarithm, which is large
+    where eigenvalues are near 0, or near the negative axis in an a far from normal. A. H. Al-Mohy
+    and N. J. Higham, "Improved inverse scaling and squaring algorithms for the matrix logarithm",
+    2012.
+    Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrOutOfMemory (no memory, or
+    the host refuses the resize), ErrNonFiniteInput (an element is not finite), ErrIterationLimit (the
+    eigenvalue iteration did not converge), ErrDegenerateValue (an eigenvalue is 0, or becomes 0
+    by rounding, so that there is no logarithm; or square roots overflow), WarnLowAccuracy (an
+    eigenvalue is below n 2.2e-16 times the Frobenius norm of a, and a not triangular: rounding errors
+    determine its logarithm).
+    NaN: a refused with ErrNonFiniteInput. */
+QX_API ErrorCode MatrixLn2026_head(QX_IN DBL2D a, QX_OUT CDB2D out);
+/** As MatrixLn2026_head, for complex elements.
+    NaN: a refused with ErrNonFiniteInput. */
+QX_API ErrorCode CxMatrixLn2026_head(QX_IN CDB2D a, QX_OUT CDB2D out);
+
 /** The real part of the principal square root in place of the square matrix a; imaginary parts,
     which negative eigenvalues give, are dropped without a sign. Through the complex Schur form with
     eigenvalues of falling modulus: A. Bjorck and S. Hammarling, "A Schur method for the square root
     of a matrix", 1983. A singular matrix may have no root, as 0 1, 0 0 has none: elements are then
-    NaN, infinite or of no meaning, and the warning is the only sign of it.
+    NaN, infinite or of no meaning, and the warning is the only sign of it. Rounding decides the sign
+    of the root of a negative eigenvalue, and numbers below 1e-12 count as 0, so that the root of a matrix
+    of elements of 1e-14 can be without a correct digit. MatrixSqrt2026_head takes matrices of any
+    size and gives +i.
     Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory),
     ErrNonFiniteInput (an element, or an eigenvalue, is not finite), ErrIterationLimit (the
     eigenvalue iteration did not converge), ErrConditionTooHigh (the eigenvalues could not be
@@ -82,10 +109,32 @@ QX_API ErrorCode MatrixSqrtH(QX_IN DBL2D a, QX_OUT CDB2D out);
 /** As MatrixSqrt_head, for complex elements; nothing is dropped. */
 QX_API int32_t CxMatrixSqrt_head(QX_INOUT CDB2D a, QX_OUT ErrorCode *err);
 
+/** The principal square root of the square matrix a, whose eigenvalues have no negative real parts.
+    Through the Schur form, whose triangle is taken by halves; of a diagonal matrix element by
+    element. Elements may be of any size: no test is against an absolute number. Eigenvalues on the
+    negative axis (as in MatrixLn2026_head) have the root with +i; where a is real and has none,
+    imaginary parts are 0. Root times root gives a back to about n 2.2e-16 |root|^2. A singular a has
+    a root where its eigenvalue 0 belongs to no more than zeros, which rounding errors decide: (0, 1;
+    0, 0) has none. A. Bjorck and S. Hammarling, "A Schur method for the square root of a matrix",
+    1983; E. Deadman, N. J. Higham and R. Ralha, "Blocked Schur algorithms for computing the matrix
+    square root", 2012.
+    Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrOutOfMemory (no memory, or
+    the host refuses the resize), ErrNonFiniteInput (an element is not finite), ErrIterationLimit (the
+    eigenvalue iteration did not converge), ErrDegenerateValue (there is no root, or it overflows),
+    WarnLowAccuracy (|root|^2 / |a| in Frobenius norms is above 1e8, so that half of the digits or
+    more are lost, and a not triangular).
+    NaN: a refused with ErrNonFiniteInput. */
+QX_API ErrorCode MatrixSqrt2026_head(QX_IN DBL2D a, QX_OUT CDB2D out);
+/** As MatrixSqrt2026_head, for complex elements.
+    NaN: a refused with ErrNonFiniteInput. */
+QX_API ErrorCode CxMatrixSqrt2026_head(QX_IN CDB2D a, QX_OUT CDB2D out);
+
 /** a^power in place of the square matrix a, by repeated squaring. Power 0 gives the identity; a
     negative power is one of the pseudo-inverse, so a singular matrix is no failure, and digits are
-    lost where the norm of a is below 1 (PseudoInverse_head). Elements that overflow, and what is
-    computed from them, are infinite or NaN.
+    lost where the norm of a is below 1 (PseudoInverse_head): the cube of the inverse of a matrix with
+    condition number 1000 can have a relative error of 2e-6 for elements of 1e-8, and has no digit at
+    1e-12. MatrixPower2026_head keeps the digits. Elements that overflow, and what is computed from
+    them, are infinite or NaN.
     Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory),
     ErrNonFiniteInput (power is negative and an element not finite), ErrIterationLimit (the singular
     value iteration did not converge).
@@ -93,6 +142,20 @@ QX_API int32_t CxMatrixSqrt_head(QX_INOUT CDB2D a, QX_OUT ErrorCode *err);
 QX_API ErrorCode MatrixPower_head(QX_INOUT DBL2D a, int32_t power);
 /** As MatrixPower_head, for complex elements. */
 QX_API ErrorCode CxMatrixPower_head(QX_INOUT CDB2D a, int32_t power);
+
+/** a^power of the square matrix a by repeated squaring; a negative power is one of the inverse by LU
+    factors, for which a is scaled by powers of two, so that digits do not depend on the size of its
+    elements. Power 0 gives the identity, also of a singular a. Elements that overflow, and what is
+    computed from them, are infinite or NaN.
+    Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrOutOfMemory (no memory, or
+    the host refuses the resize), ErrNonFiniteInput (an element is not finite), ErrSingularMatrix
+    (power is negative and a pivot 0), WarnLowAccuracy (power is negative and the estimated reciprocal
+    condition number of a in the 1-norm below 2.2e-16).
+    NaN: a refused with ErrNonFiniteInput. */
+QX_API ErrorCode MatrixPower2026_head(QX_IN DBL2D a, int32_t power, QX_OUT DBL2D out);
+/** As MatrixPower2026_head, for complex elements.
+    NaN: a refused with ErrNonFiniteInput. */
+QX_API ErrorCode CxMatrixPower2026_head(QX_IN CDB2D a, int32_t power, QX_OUT CDB2D out);
 
 /** The pseudo-inverse (E. H. Moore, R. Penrose) in place of the m by n matrix a, n by m: v
     diag(1/s) u^T of its singular value decomposition. Values not above *tolerance, an absolute

@@ -457,6 +457,10 @@ def CxSchur80_head(a: ArrayLike, wantVectors: int, order: int) -> tuple[NDArray[
     """As Schur80_head, for complex elements: a = u t u^H with a triangular t. Schur form a = u t u^T ..."""
 
 
+def Schur2026_head(a: ArrayLike, wantVectors: int, order: int) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.complex128]]:
+    """As Schur80_head, with eigenvalues that are in order as w has them: blocks are sorted, by up to ..."""
+
+
 def create_oxfft_table(length: int) -> Pointer:
     """The plan for transforms of `length` values, built at the first request and shared after it."""
 
@@ -1265,6 +1269,14 @@ def CxMatrixLn_head(a: ArrayLike) -> NDArray[np.complex128]:
     """As MatrixLn_head, for complex elements and in place. The principal logarithm of the square matrix a."""
 
 
+def MatrixLn2026_head(a: ArrayLike) -> NDArray[np.complex128]:
+    """The principal logarithm of the square matrix a, whose exponential is a and whose eigenvalues ..."""
+
+
+def CxMatrixLn2026_head(a: ArrayLike) -> NDArray[np.complex128]:
+    """As MatrixLn2026_head, for complex elements. The principal logarithm of the square matrix a, ..."""
+
+
 def MatrixSqrt_head(a: ArrayLike) -> NDArray[np.float64]:
     """The real part of the principal square root in place of the square matrix a; imaginary parts, ..."""
 
@@ -1277,12 +1289,28 @@ def CxMatrixSqrt_head(a: ArrayLike) -> NDArray[np.complex128]:
     """As MatrixSqrt_head, for complex elements; nothing is dropped. The real part of the principal ..."""
 
 
+def MatrixSqrt2026_head(a: ArrayLike) -> NDArray[np.complex128]:
+    """The principal square root of the square matrix a, whose eigenvalues have no negative real parts."""
+
+
+def CxMatrixSqrt2026_head(a: ArrayLike) -> NDArray[np.complex128]:
+    """As MatrixSqrt2026_head, for complex elements. The principal square root of the square matrix a, ..."""
+
+
 def MatrixPower_head(a: ArrayLike, power: int) -> NDArray[np.float64]:
     """a^power in place of the square matrix a, by repeated squaring."""
 
 
 def CxMatrixPower_head(a: ArrayLike, power: int) -> NDArray[np.complex128]:
     """As MatrixPower_head, for complex elements. a^power in place of the square matrix a, by repeated ..."""
+
+
+def MatrixPower2026_head(a: ArrayLike, power: int) -> NDArray[np.float64]:
+    """a^power of the square matrix a by repeated squaring; a negative power is one of the inverse by ..."""
+
+
+def CxMatrixPower2026_head(a: ArrayLike, power: int) -> NDArray[np.complex128]:
+    """As MatrixPower2026_head, for complex elements. a^power of the square matrix a by repeated ..."""
 
 
 def PseudoInverse_head(a: ArrayLike, tolerance: float) -> NDArray[np.float64]:

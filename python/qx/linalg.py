@@ -1011,8 +1011,13 @@ def expm(a: ArrayLike) -> NDArray[Any]:
     return _each(lambda a: _served("expm", a)(a), _matrix("linalg.expm", a, True))
 
 
+def _real_of_real(a: NDArray[Any], found: NDArray[Any]) -> NDArray[Any]:
+    """A function of a real matrix, which is real where no imaginary part is left."""
+    return found.real if a.dtype.kind != "c" and not np.any(found.imag) else found
+
+
 def logm(a: ArrayLike) -> NDArray[Any]:
-    """The principal logarithm of a square matrix.
+    """The principal logarithm of a square matrix; of negative eigenvalues with +i pi.
 
     Parameters
     ----------
@@ -1022,27 +1027,23 @@ def logm(a: ArrayLike) -> NDArray[Any]:
     Returns
     -------
     ndarray
-        Complex where eigenvalues are negative or complex.
+        Real where a is real and has no negative eigenvalue.
 
     Raises
     ------
     numpy.linalg.LinAlgError
-        If a is not square, or its eigenvectors are dependent.
+        If a is not square.
     ValueError
         If a has the eigenvalue 0, or an element that is not finite.
 
     Examples
     --------
     >>> import qx
-    >>> qx.linalg.logm([[1.0, 1.0], [0.0, 1.0]]).real.round(9) + 0.0
+    >>> qx.linalg.logm([[1.0, 1.0], [0.0, 1.0]])
     array([[0., 1.],
            [0., 0.]])
     """
-    def of_one(a: Any) -> Any:
-        found = _served("logm", a)(a)
-        return found.real if found.dtype.kind == "c" and a.dtype.kind != "c" and not np.any(found.imag) else found
-
-    return _each(of_one, _matrix("linalg.logm", a, True))
+    return _each(lambda a: _real_of_real(a, _served("logm", a)(a)), _matrix("linalg.logm", a, True))
 
 
 def sqrtm(a: ArrayLike) -> NDArray[Any]:
@@ -1056,28 +1057,23 @@ def sqrtm(a: ArrayLike) -> NDArray[Any]:
     Returns
     -------
     ndarray
-        Complex where eigenvalues are negative.
+        Real where a is real and has no negative eigenvalue.
 
     Raises
     ------
     numpy.linalg.LinAlgError
         If a is not square.
     ValueError
-        If a is empty or has an element that is not finite.
+        If a is empty or has an element that is not finite, or there is no root.
 
     Examples
     --------
     >>> import qx
-    >>> qx.linalg.sqrtm([[4.0, 0.0], [0.0, 9.0]]).round(12)
+    >>> qx.linalg.sqrtm([[4.0, 0.0], [0.0, 9.0]])
     array([[2., 0.],
            [0., 3.]])
     """
-    def of_one(a: Any) -> Any:
-        found = _served("sqrtm", a)(a)
-        dust = 10 * len(a) * EPS * np.abs(found).max()  # of the complex Schur form, where the root is real
-        return found.real if a.dtype.kind != "c" and not np.any(np.abs(found.imag) > dust) else found
-
-    return _each(of_one, _matrix("linalg.sqrtm", a, True))
+    return _each(lambda a: _real_of_real(a, _served("sqrtm", a)(a)), _matrix("linalg.sqrtm", a, True))
 
 
 def matrix_power(a: ArrayLike, n: int) -> NDArray[Any]:
@@ -1107,10 +1103,7 @@ def matrix_power(a: ArrayLike, n: int) -> NDArray[Any]:
            [0., 1.]])
     """
     n = whole_number("linalg.matrix_power", "n", n)
-    a = _matrix("linalg.matrix_power", a, True)
-    if n < 0:
-        return matrix_power(inv(a), -n)
-    return _each(lambda a: _served("matrix_power", a)(a, n), a)
+    return _each(lambda a: _served("matrix_power", a)(a, n), _matrix("linalg.matrix_power", a, True))
 
 
 def solve_sylvester(a: ArrayLike, b: ArrayLike, q: ArrayLike) -> NDArray[Any]:

@@ -103,14 +103,14 @@ NEWEST = {
         "SymEvectorEvalue_head", "svd": "SVD2026_head", "svd_complex": "CxSVD2026_head", "svdvals":
         "SVDS2026_head", "svdvals_complex": "CxSVDS2026_head", "qr": "QRDecH", "qr_complex": "CxQRDecH",
         "cholesky": "FullCholesky_head", "cholesky_complex": "CxFullCholesky_head", "schur":
-        "Schur80_head", "schur_complex": "CxSchur80_head", "qz": "QZ80_head", "qz_complex":
+        "Schur2026_head", "schur_complex": "CxSchur80_head", "qz": "QZ80_head", "qz_complex":
         "CxQZ80_head", "hessenberg": "Hessenberg_head", "hessenberg_complex": "CxHessenberg_head",
-        "expm": "MatrixExp2026_head", "expm_complex": "CxMatrixExp2026_head", "logm": "MatrixLn_head",
-        "logm_complex": "CxMatrixLn_head", "sqrtm": "MatrixSqrtH", "sqrtm_complex":
-        "CxMatrixSqrt_head", "matrix_power": "MatrixPower_head", "matrix_power_complex":
-        "CxMatrixPower_head", "solve_sylvester": "Sylvester2011_head", "solve_sylvester_complex":
-        "CxSylvester2011_head", "solve_lyapunov": "Lyapunov2011_head", "solve_lyapunov_complex":
-        "CxLyapunov2011_head", "solve_banded": "BandEqsDriH", "solve_banded_complex":
+        "expm": "MatrixExp2026_head", "expm_complex": "CxMatrixExp2026_head", "logm":
+        "MatrixLn2026_head", "logm_complex": "CxMatrixLn2026_head", "sqrtm": "MatrixSqrt2026_head",
+        "sqrtm_complex": "CxMatrixSqrt2026_head", "matrix_power": "MatrixPower2026_head",
+        "matrix_power_complex": "CxMatrixPower2026_head", "solve_sylvester": "Sylvester2011_head",
+        "solve_sylvester_complex": "CxSylvester2011_head", "solve_lyapunov": "Lyapunov2011_head",
+        "solve_lyapunov_complex": "CxLyapunov2011_head", "solve_banded": "BandEqsDriH", "solve_banded_complex":
         "CxBandEqsDriH", "solve_banded_many": "BandEqsSetDriH", "solve_banded_many_complex":
         "CxBandEqsSetDriH", "charpoly": "MatrixCharacteristicPoly_head", "charpoly_complex":
         "CxMatrixCharacteristicPoly_head", "is_positive_definite": "CheckPosdef_head",

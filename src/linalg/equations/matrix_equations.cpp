@@ -68,15 +68,6 @@ struct Given {
 };
 
 template <ElementType E>
-double FrobeniusNorm(const ConstMatrixView<E> &a) {
-    double squares = 0.0;
-    for (int32_t i = 0; i < a.rows(); ++i)
-        for (int32_t j = 0; j < a.cols(); ++j)
-            squares += SquaredModulus(a(i, j));
-    return std::sqrt(squares);
-}
-
-template <ElementType E>
 void AdjointInPlace(const MatrixView<E> &a) {
     for (int32_t i = 0; i < a.rows(); ++i)
         for (int32_t j = 0; j <= i; ++j) {
@@ -143,7 +134,7 @@ private:
     ErrorCode factor() {
         a_.copyTo(sFactors_.t());
         aNorm_ = FrobeniusNorm<E>(sFactors_.t());
-        if (const ErrorCode failed = sFactors_.compute(aNorm_))
+        if (const ErrorCode failed = sFactors_.compute(NegligibleIn(aNorm_)))
             return failed;
         if (lyapunov_) {
             tFactors_.setAdjoint(sFactors_);
@@ -152,7 +143,7 @@ private:
         }
         b_.copyTo(tFactors_.t());
         bNorm_ = FrobeniusNorm<E>(tFactors_.t());
-        return tFactors_.compute(bNorm_);
+        return tFactors_.compute(NegligibleIn(bNorm_));
     }
 
     // A common power of two is taken from a and b in a sum; in a x b - x one is taken from the

@@ -30,7 +30,7 @@ ErrorCode SchurFactors<E>::allocate(int32_t n) {
 }
 
 template <ElementType E>
-ErrorCode SchurFactors<E>::compute(double norm) {
+ErrorCode SchurFactors<E>::compute(double negligible) {
     MatrixView<E> z;
     RealVector exchanges;
     ScratchParts memory;
@@ -42,8 +42,7 @@ ErrorCode SchurFactors<E>::compute(double norm) {
         return failed;
     UndoPermutation<E>(exchanges, range, z);
     CopyTransposed<E>(z, adjoint_);
-    // Each element that is dropped counts a little; all together they stay within the norm's eps.
-    if (const ErrorCode failed = iterate(range, epsilon / 16.0 * norm))
+    if (const ErrorCode failed = iterate(range, negligible))
         return failed;
     clearBelowDiagonal();
     ConjugateInPlace<E>(adjoint_);

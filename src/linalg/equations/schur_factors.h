@@ -6,16 +6,17 @@
 namespace qx {
 
 // a = z t z^H with unitary z and (quasi-)triangular t, by our own iteration and so with the same
-// bits on every processor. What is below the norm's eps does not count, so the form is backward
-// stable for the norm of a and not for small parts of a graded matrix; strongly graded ones
-// converge for it. t has exact zeros below its diagonal, blocks of two aside.
+// bits on every processor. t has exact zeros below its diagonal, blocks of two aside.
 template <ElementType E>
 class SchurFactors {
 public:
     // t() is a matrix of order n whose largest element is about 1, and becomes its Schur form.
-    // ErrOutOfMemory from either, ErrIterationLimit from compute().
+    // An element beside the diagonal counts as 0 where it is within eps of its neighbours or at most
+    // `negligible`. With NegligibleIn(norm of a) the form is backward stable for the norm of a and
+    // not for small parts of a graded matrix, and strongly graded ones converge for it; with 0 some
+    // of these do not. ErrOutOfMemory from either, ErrIterationLimit from compute().
     ErrorCode allocate(int32_t n);
-    ErrorCode compute(double norm);
+    ErrorCode compute(double negligible);
     // The factors of a^H from those of a, with the rows and columns of t in reverse order, which
     // keeps it upper triangular.
     void setAdjoint(const SchurFactors &a);
@@ -33,6 +34,18 @@ private:
     MatrixView<E> t_, adjoint_;
     ComplexVector values_;
 };
+
+template <ElementType E>
+double FrobeniusNorm(const ConstMatrixView<E> &a) {
+    double squares = 0.0;
+    for (int32_t i = 0; i < a.rows(); ++i)
+        for (int32_t j = 0; j < a.cols(); ++j)
+            squares += SquaredModulus(a(i, j));
+    return std::sqrt(squares);
+}
+
+// Each element that is dropped counts a little; all together they stay within the norm's eps.
+inline double NegligibleIn(double norm) { return epsilon / 16.0 * norm; }
 
 // to = from^H.
 template <ElementType E>

@@ -51,7 +51,8 @@ Outcome SymEigen(InOut<DBL2D> a, int32_t output, Out<DBL1D> values) {
 }
 
 template <class Matrix>
-Outcome Schur(InOut<Matrix> a, bool withVectors, int32_t order, Out<Matrix> u, Out<CDB1D> w) {
+Outcome PrepareSchur(const InOut<Matrix> &a, bool withVectors, int32_t order, Out<Matrix> &u,
+                     Out<CDB1D> &w) {
     const int32_t n = a.rows();
     if (const ErrorCode bad = FirstFailed({{a.isEmpty(), ErrEmptyInput},
                                            {!a.isSquare(), ErrNotSquare},
@@ -59,10 +60,20 @@ Outcome Schur(InOut<Matrix> a, bool withVectors, int32_t order, Out<Matrix> u, O
         return bad;
     if (const Outcome bad = ResizeIf(withVectors, u, n))
         return bad;
-    if (const Outcome bad = w.resize(n))
+    return w.resize(n);
+}
+template <class Matrix>
+Outcome Schur(InOut<Matrix> a, bool withVectors, int32_t order, Out<Matrix> u, Out<CDB1D> w) {
+    if (const Outcome bad = PrepareSchur<Matrix>(a, withVectors, order, u, w))
         return bad;
     return SchurDecompose<elementOf<Matrix>>(a.view(), SchurOrder{order}, u.view(), a.view(),
                                              w.view());
+}
+Outcome Schur2026(InOut<DBL2D> a, bool withVectors, int32_t order, Out<DBL2D> u, Out<CDB1D> w) {
+    if (const Outcome bad = PrepareSchur<DBL2D>(a, withVectors, order, u, w))
+        return bad;
+    return SchurInOrder<ElementType::DBL>(a.view(), SchurOrder{order}, u.view(), a.view(),
+                                          w.view());
 }
 
 } // namespace
@@ -85,6 +96,9 @@ int32_t SymEvectorEvalue_head(DBL2D a, const int32_t *output, DBL1D values, Erro
 
 ErrorCode Schur80_head(DBL2D a, int32_t wantVectors, int32_t order, DBL2D u, CDB1D w) {
     return Returned(qx::Schur<DBL2D>, a, wantVectors != 0, order, u, w);
+}
+ErrorCode Schur2026_head(DBL2D a, int32_t wantVectors, int32_t order, DBL2D u, CDB1D w) {
+    return Returned(qx::Schur2026, a, wantVectors != 0, order, u, w);
 }
 ErrorCode CxSchur80_head(CDB2D a, int32_t wantVectors, int32_t order, CDB2D u, CDB1D w) {
     return Returned(qx::Schur<CDB2D>, a, wantVectors != 0, order, u, w);

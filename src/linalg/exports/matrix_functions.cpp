@@ -86,6 +86,31 @@ Outcome Power(InOut<Matrix> a, int32_t power) {
 }
 
 template <class Matrix>
+Outcome Logarithm2026(In<Matrix> a, Out<CDB2D> out) {
+    if (const ErrorCode bad = SquareFirst(a))
+        return bad;
+    if (const Outcome bad = out.resize(a.rows(), a.rows()))
+        return bad;
+    return PrincipalMatrixLogarithm<elementOf<Matrix>>(a.view(), out.view());
+}
+template <class Matrix>
+Outcome SquareRoot2026(In<Matrix> a, Out<CDB2D> out) {
+    if (const ErrorCode bad = SquareFirst(a))
+        return bad;
+    if (const Outcome bad = out.resize(a.rows(), a.rows()))
+        return bad;
+    return PrincipalMatrixSquareRoot<elementOf<Matrix>>(a.view(), out.view());
+}
+template <class Matrix>
+Outcome Power2026(In<Matrix> a, int32_t power, Out<Matrix> out) {
+    if (const ErrorCode bad = SquareFirst(a))
+        return bad;
+    if (const Outcome bad = out.resize(a.rows(), a.rows()))
+        return bad;
+    return ScaledMatrixPower<elementOf<Matrix>>(a.view(), power, out.view());
+}
+
+template <class Matrix>
 Outcome PseudoInverse(InOut<Matrix> a, double tolerance) {
     if (a.isEmpty())
         return ErrEmptyInput;
@@ -140,6 +165,24 @@ ErrorCode MatrixExp2026_head(DBL2D a, DBL2D out) {
 }
 ErrorCode CxMatrixExp2026_head(CDB2D a, CDB2D out) {
     return Returned(qx::Exponential2026<CDB2D>, a, out);
+}
+ErrorCode MatrixLn2026_head(DBL2D a, CDB2D out) {
+    return Returned(qx::Logarithm2026<DBL2D>, a, out);
+}
+ErrorCode CxMatrixLn2026_head(CDB2D a, CDB2D out) {
+    return Returned(qx::Logarithm2026<CDB2D>, a, out);
+}
+ErrorCode MatrixSqrt2026_head(DBL2D a, CDB2D out) {
+    return Returned(qx::SquareRoot2026<DBL2D>, a, out);
+}
+ErrorCode CxMatrixSqrt2026_head(CDB2D a, CDB2D out) {
+    return Returned(qx::SquareRoot2026<CDB2D>, a, out);
+}
+ErrorCode MatrixPower2026_head(DBL2D a, int32_t power, DBL2D out) {
+    return Returned(qx::Power2026<DBL2D>, a, power, out);
+}
+ErrorCode CxMatrixPower2026_head(CDB2D a, int32_t power, CDB2D out) {
+    return Returned(qx::Power2026<CDB2D>, a, power, out);
 }
 ErrorCode PseudoInverse2026_head(DBL2D a, double tolerance, DBL2D out) {
     return Returned(qx::PseudoInverse2026<DBL2D>, a, tolerance, out);

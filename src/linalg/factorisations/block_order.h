@@ -29,6 +29,15 @@ public:
         sizes_[count_++] = size;
     }
 
+    // Before blocks are added anew.
+    void clear() { count_ = 0; }
+    bool isInOrder() const {
+        for (int32_t k = 1; k < count_; ++k)
+            if (keys_[k] < keys_[k - 1])
+                return false;
+        return true;
+    }
+
     // Bubble sort. move(from, to) brings the block at row `from` up to row `to` and returns
     // LAPACK's info; blocks that it finds too close to exchange stay as they are.
     template <class Move>

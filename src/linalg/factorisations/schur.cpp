@@ -16,30 +16,39 @@ class OrderedSchur {
 public:
     explicit OrderedSchur(int32_t n) : n_(n) {}
 
-    ErrorCode compute(const ConstMatrixView<E> &a, SchurOrder order, bool withVectors,
-                      ComplexVector w) {
+    // Without an order.
+    ErrorCode compute(const ConstMatrixView<E> &a, bool withVectors, ComplexVector w) {
         const int32_t vectorsOrder = withVectors ? n_ : 0;
         if (const ErrorCode failed =
                 memory_.take(Aligned(Sized(form_, n_, n_)),
                              Aligned(Sized(vectors_, vectorsOrder, vectorsOrder))))
             return failed;
-        T *const vectors = withVectors ? vectors_.data() : nullptr;
         CopyTransposed<E>(a, form_);
-        const int32_t info = lapack::Schur(n_, form_.data(), w.data(), vectors);
+        const int32_t info = lapack::Schur(n_, form_.data(), w.data(), vectors());
         if (const ErrorCode failed = CodeOfSchur(info, n_))
             return failed;
-        if (order == schurUnordered)
-            return 0;
-        if (const ErrorCode failed = blocks_.allocate(n_))
-            return failed;
+        return blocks_.allocate(n_);
+    }
+    ErrorCode sort(SchurOrder order, ComplexVector w) {
         classify(order, w);
-        const auto move = [=, this](int32_t from, int32_t to) {
-            return lapack::MoveInSchur(n_, form_.data(), vectors, from, to);
+        const auto move = [this](int32_t from, int32_t to) {
+            return lapack::MoveInSchur(n_, form_.data(), vectors(), from, to);
         };
         if (const ErrorCode failed = blocks_.sort(move))
             return failed;
         readValues(w);
         return 0;
+    }
+    ErrorCode sortUntilInOrder(SchurOrder order, ComplexVector w) {
+        constexpr int mostRounds = 20; // two were enough for all that were tried
+        for (int round = 0; round < mostRounds; ++round) {
+            if (const ErrorCode failed = sort(order, w))
+                return failed;
+            classify(order, w);
+            if (blocks_.isInOrder())
+                return 0;
+        }
+        return WarnLowAccuracy;
     }
     void write(const MatrixView<E> &t, const MatrixView<E> &z) const {
         CopyTransposed<E>(form_, t);
@@ -48,11 +57,13 @@ public:
     }
 
 private:
+    T *vectors() const { return vectors_.isEmpty() ? nullptr : vectors_.data(); }
     // Column after column, as LAPACK has it.
     T &at(int32_t i, int32_t j) const { return form_(j, i); }
 
     // The blocks along the diagonal, each with the key by which they ascend.
     void classify(SchurOrder order, ComplexVector w) {
+        blocks_.clear();
         const double tiny = epsilon * sumOf(w);
         for (int32_t i = 0; i < n_;) {
             const bool isPair = E == ElementType::DBL && w[i].im != 0.0 && i + 1 < n_;
@@ -102,14 +113,34 @@ ErrorCode SchurDecompose(const ConstMatrixView<E> &a, SchurOrder order, const Ma
     if (!AllFinite<E>(a))
         return ErrNonFiniteInput;
     OrderedSchur<E> schur(a.rows());
-    if (const ErrorCode failed = schur.compute(a, order, !z.isEmpty(), w))
+    if (const ErrorCode failed = schur.compute(a, !z.isEmpty(), w))
         return failed;
+    if (order != schurUnordered)
+        if (const ErrorCode failed = schur.sort(order, w))
+            return failed;
     schur.write(t, z);
     return 0;
 }
 
+template <ElementType E>
+ErrorCode SchurInOrder(const ConstMatrixView<E> &a, SchurOrder order, const MatrixView<E> &z,
+                       const MatrixView<E> &t, ComplexVector w) {
+    QX_EXPECTS(a.isSquare() && !a.isEmpty() && w.size() == a.rows());
+    if (!HoldsOnlyNumbers<E>(a))
+        return ErrNonFiniteInput;
+    OrderedSchur<E> schur(a.rows());
+    if (const ErrorCode failed = schur.compute(a, !z.isEmpty(), w))
+        return failed;
+    const ErrorCode status = order == schurUnordered ? 0 : schur.sortUntilInOrder(order, w);
+    if (status >= 0)
+        schur.write(t, z);
+    return status;
+}
+
 template ErrorCode SchurDecompose(const ConstRealMatrix &, SchurOrder, const RealMatrix &,
                                   const RealMatrix &, ComplexVector);
+template ErrorCode SchurInOrder(const ConstRealMatrix &, SchurOrder, const RealMatrix &,
+                                const RealMatrix &, ComplexVector);
 template ErrorCode SchurDecompose(const ConstComplexMatrix &, SchurOrder, const ComplexMatrix &,
                                   const ComplexMatrix &, ComplexVector);
 

@@ -23,6 +23,13 @@ template <ElementType E>
 ErrorCode SchurDecompose(const ConstMatrixView<E> &a, SchurOrder order, const MatrixView<E> &z,
                          const MatrixView<E> &t, ComplexVector w);
 
+// The same with eigenvalues that are in order as they stand in t: an exchange with a block of two
+// changes small ones, so that blocks are sorted again by what they have become. ErrNonFiniteInput,
+// ErrOutOfMemory, ErrIterationLimit; WarnLowAccuracy where some stay out of order all the same.
+template <ElementType E>
+ErrorCode SchurInOrder(const ConstMatrixView<E> &a, SchurOrder order, const MatrixView<E> &z,
+                       const MatrixView<E> &t, ComplexVector w);
+
 } // namespace qx
 
 #endif

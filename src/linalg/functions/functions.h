@@ -37,9 +37,27 @@ ErrorCode MatrixSquareRoot(const ConstComplexMatrix &a, const ComplexMatrix &roo
 // reached: the best that was found); the codes of the eigenproblem.
 ErrorCode MatrixLogarithm(const ComplexMatrix &a);
 
+// The principal logarithm and square root of a real or complex matrix of any size of elements,
+// through the Schur form (triangular_functions.h). Real eigenvalues of a real matrix, and in a
+// complex one those that rounding errors do not tell from negative numbers, are on the cut and have
+// the logarithm with +i pi and the root with +i; a real matrix without negative eigenvalues has a
+// real result. ErrNonFiniteInput; ErrIterationLimit; ErrDegenerateValue (a has no such function, or
+// it overflows). WarnLowAccuracy: of a logarithm where an eigenvalue is no more than rounding
+// errors, of a root where |root|^2 / |a|, by which errors grow, is above 1e8; not for triangles.
+template <ElementType E>
+ErrorCode PrincipalMatrixLogarithm(const ConstMatrixView<E> &a, const ComplexMatrix &out);
+template <ElementType E>
+ErrorCode PrincipalMatrixSquareRoot(const ConstMatrixView<E> &a, const ComplexMatrix &out);
+
 // out = a^power by repeated squaring; a negative power is one of the pseudo-inverse. out may be a.
 template <ElementType E>
 ErrorCode MatrixPower(const ConstMatrixView<E> &a, int32_t power, const MatrixView<E> &out);
+
+// The same with negative powers of the inverse by LU, scaled by powers of two. ErrNonFiniteInput,
+// whatever the power; ErrSingularMatrix; WarnLowAccuracy where the reciprocal condition number of an
+// a to be inverted is below eps.
+template <ElementType E>
+ErrorCode ScaledMatrixPower(const ConstMatrixView<E> &a, int32_t power, const MatrixView<E> &out);
 
 } // namespace qx
 

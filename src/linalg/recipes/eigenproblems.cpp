@@ -39,6 +39,7 @@ std::vector<Recipe> EigenproblemRecipes() {
     for (const int32_t order : {0, 1, 2, 3, 4}) {
         recipes.push_back(Schur80<DBL>("Schur80_head", order, Schur80_head));
         recipes.push_back(Schur80<CDB>("CxSchur80_head", order, CxSchur80_head));
+        recipes.push_back(Schur80<DBL>("Schur2026_head", order, Schur2026_head));
     }
     for (const int32_t output : {0, 1}) {
         const std::string variant = ": output " + std::to_string(output);

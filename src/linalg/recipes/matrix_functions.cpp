@@ -39,6 +39,26 @@ Recipe Exponential2026(const char *name, Export function) {
             [function](Call &c) { return function(c.in2D<Code>(0, c.n, c.n), c.out2D<Code>(0)); },
             None, sizes};
 }
+// Random matrices have negative and complex eigenvalues, definite ones have a real function.
+template <ElementType Code, class Export>
+void AddComplexFunctions(std::vector<Recipe> *recipes, const std::string &name, Export function) {
+    recipes->push_back(
+        {name,
+         [=](Call &c) { return function(c.in2D<Code>(0, c.n, c.n), c.out2D<ElementType::CDB>(0)); },
+         None, sizes});
+    recipes->push_back({name + ": definite",
+                        [=](Call &c) {
+                            return function(c.in2D<Code>(0, c.n, c.n, PositiveDefinite{c.n}),
+                                            c.out2D<ElementType::CDB>(0));
+                        },
+                        None, sizes});
+}
+template <ElementType Code, class Export>
+Recipe Power2026(std::string name, int32_t power, Export function) {
+    return {name + ": power " + std::to_string(power),
+            [=](Call &c) { return function(c.in2D<Code>(0, c.n, c.n), power, c.out2D<Code>(0)); },
+            None, sizes};
+}
 template <ElementType Code, class Export>
 Recipe PseudoInverse2026(const char *name, Export function) {
     return {name,
@@ -71,7 +91,13 @@ std::vector<Recipe> FunctionRecipes() {
         PseudoInverse2026<DBL>("PseudoInverse2026_head", PseudoInverse2026_head),
         PseudoInverse2026<CDB>("CxPseudoInverse2026_head", CxPseudoInverse2026_head),
     };
+    AddComplexFunctions<DBL>(&recipes, "MatrixLn2026_head", MatrixLn2026_head);
+    AddComplexFunctions<CDB>(&recipes, "CxMatrixLn2026_head", CxMatrixLn2026_head);
+    AddComplexFunctions<DBL>(&recipes, "MatrixSqrt2026_head", MatrixSqrt2026_head);
+    AddComplexFunctions<CDB>(&recipes, "CxMatrixSqrt2026_head", CxMatrixSqrt2026_head);
     for (const int32_t power : {-2, 0, 5}) {
+        recipes.push_back(Power2026<DBL>("MatrixPower2026_head", power, MatrixPower2026_head));
+        recipes.push_back(Power2026<CDB>("CxMatrixPower2026_head", power, CxMatrixPower2026_head));
         recipes.push_back(Power<DBL>("MatrixPower_head", power, MatrixPower_head));
         recipes.push_back(Power<CDB>("CxMatrixPower_head", power, CxMatrixPower_head));
     }

@@ -175,11 +175,41 @@ TEST(Schur, GivesTheMatrixBackWithItsEigenvaluesInOrder) {
         for (const int32_t order : {0, 1, 2, 3, 4}) {
             SCOPED_TRACE(testing::Message() << "order " << order << ", n " << n);
             ExpectSchur(RealMatrix(MatrixKinds()[0], n, n), n, order, Schur80_head);
+            ExpectSchur(RealMatrix(MatrixKinds()[0], n, n), n, order, Schur2026_head);
             ExpectSchur(ComplexMatrix(MatrixKinds()[0], n, n), n, order, CxSchur80_head);
         }
     // From 150 on the number of LAPACK's shifts follows from logarithms.
     ExpectSchur(RealMatrix(MatrixKinds()[0], 160, 160), 160, 0, Schur80_head);
     ExpectSchur(ComplexMatrix(MatrixKinds()[0], 160, 160), 160, 0, CxSchur80_head);
+}
+TEST(Schur, OfTheRevisionIsInOrderForGradedMatrices) {
+    constexpr int n = 30;
+    int elderOutOfOrder = 0;
+    for (uint64_t seed = 1; seed <= 8; ++seed)
+        for (const int32_t order : {1, 2, 3, 4}) {
+            SCOPED_TRACE(testing::Message() << "order " << order << ", seed " << seed);
+            auto a = qx::test::Reals(n * n, seed);
+            for (int i = 0; i < n * n; ++i)
+                a[i] = std::ldexp(a[i], -2 * (i / n + i % n));
+            ExpectSchur(a, n, order, Schur2026_head);
+            const auto isInOrder = [&](auto schur) {
+                auto t = Matrix(n, n, a);
+                decltype(t) u;
+                CDBArray w;
+                EXPECT_EQ(schur(t.handle(), 0, order, u.handle(), w.handle()), 0);
+                bool result = true;
+                for (int i = 1; i < n; ++i) {
+                    const double last =
+                        order < 3 ? w[i - 1].re : std::hypot(w[i - 1].re, w[i - 1].im);
+                    const double next = order < 3 ? w[i].re : std::hypot(w[i].re, w[i].im);
+                    result = result && (order % 2 == 1 ? last <= next : last >= next);
+                }
+                return result;
+            };
+            EXPECT_TRUE(isInOrder(Schur2026_head));
+            elderOutOfOrder += isInOrder(Schur80_head) ? 0 : 1;
+        }
+    EXPECT_GT(elderOutOfOrder, 0) << "the matrices try nothing";
 }
 
 } // namespace

@@ -7,8 +7,10 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <complex>
 #include <cstdlib>
+#include <cstring>
 #include <fstream>
 #include <limits>
 #include <string>
@@ -48,13 +50,15 @@ struct Case {
     }
 };
 
-std::vector<Case> ReadCases() {
-    std::ifstream file(TestData("matrix_functions.dat"));
+std::vector<Case> ReadCases(const char *fileName, bool withExponentials) {
+    std::ifstream file(TestData(fileName));
     std::vector<Case> cases;
     Case next;
     while (file >> next.name >> next.n) {
         for (std::vector<CDB> *matrix : {&next.a, &next.exp, &next.log, &next.root}) {
             matrix->clear();
+            if (matrix == &next.exp && !withExponentials)
+                continue;
             std::string re, im;
             for (int i = 0; i < next.n * next.n && file >> re >> im; ++i)
                 matrix->push_back(
@@ -66,7 +70,7 @@ std::vector<Case> ReadCases() {
 }
 
 TEST(MatrixFunctions, AgreeWithSixtyDigits) {
-    const std::vector<Case> cases = ReadCases();
+    const std::vector<Case> cases = ReadCases("matrix_functions.dat", true);
     ASSERT_GE(cases.size(), 10U);
     for (const Case &c : cases) {
         SCOPED_TRACE(c.name);
@@ -109,6 +113,129 @@ TEST(MatrixFunctions, AgreeWithSixtyDigits) {
         for (int i = 0; i < c.n * c.n; ++i)
             EXPECT_EQ(realRoot[i], root[i].re);
     }
+}
+
+// Elements divided by 2^exponent, so that their squares neither overflow nor vanish.
+Exact AwayFromEnds(int n, const std::vector<CDB> &elements) {
+    int exponent = 0;
+    double largest = 0.0;
+    for (const CDB &x : elements)
+        largest = std::max({largest, std::fabs(x.re), std::fabs(x.im)});
+    std::frexp(largest, &exponent);
+    return Exact(n, n, Scaled(elements, -exponent / 2).data());
+}
+
+void ExpectSame(const CDB2DArray &a, const CDB2DArray &b) {
+    ASSERT_EQ(a.values().size(), b.values().size());
+    EXPECT_EQ(std::memcmp(a.values().data(), b.values().data(), a.values().size() * sizeof(CDB)),
+              0);
+}
+
+TEST(MatrixFunctions, OfTheRevisionsAgreeWithReferences) {
+    std::vector<Case> cases = ReadCases("hard_matrix_functions.dat", false);
+    ASSERT_EQ(cases.size(), 11U);
+    for (const Case &c : ReadCases("matrix_functions.dat", true))
+        cases.push_back(c);
+    for (const Case &c : cases) {
+        SCOPED_TRACE(c.name);
+        const Exact log(c.n, c.n, c.log.data());
+        CDB2DArray out, ofReal;
+        EXPECT_EQ(CxMatrixLn2026_head(CDB2DArray(c.n, c.n, c.a).handle(), out.handle()), 0);
+        EXPECT_LT(RelativeDeviation(Contents(out), log), 2e-13);
+        if (c.isReal()) {
+            EXPECT_EQ(MatrixLn2026_head(DBL2DArray(c.n, c.n, c.real()).handle(), ofReal.handle()),
+                      0);
+            ExpectSame(ofReal, out);
+        }
+        EXPECT_EQ(CxMatrixSqrt2026_head(CDB2DArray(c.n, c.n, c.a).handle(), out.handle()), 0);
+        EXPECT_LT(RelativeDeviation(AwayFromEnds(c.n, out.values()), AwayFromEnds(c.n, c.root)),
+                  1e-13);
+        if (c.isReal()) {
+            EXPECT_EQ(MatrixSqrt2026_head(DBL2DArray(c.n, c.n, c.real()).handle(), ofReal.handle()),
+                      0);
+            ExpectSame(ofReal, out);
+        }
+    }
+}
+
+// By halves, and with every degree and number of roots: the root squared and the exponential of the
+// logarithm give a back.
+template <class Elements, class Log, class Root>
+void ExpectInverted(const Elements &elements, int n, Log log, Root root) {
+    const auto a = Matrix(n, n, elements);
+    CDB2DArray found, back;
+    ASSERT_EQ(root(a.handle(), found.handle()), 0);
+    const Exact r = Contents(found), exact(n, n, elements.data());
+    const long double unit = n * 0x1p-52L;
+    EXPECT_LT((r * r - exact).norm(), 4 * unit * r.norm() * r.norm());
+    ASSERT_EQ(log(a.handle(), found.handle()), 0);
+    const long double condition = 10 + Contents(found).norm();
+    ASSERT_EQ(CxMatrixExp2026_head(found.handle(), back.handle()), 0);
+    EXPECT_LT((Contents(back) - exact).norm(), 8 * unit * condition * exact.norm());
+}
+TEST(MatrixFunctions, OfTheRevisionsAreInvertedAtHigherOrders) {
+    for (const int n : {1, 2, 4, 16, 17, 33, 70})
+        for (const double shift : {0.0, 0.5, 2.0, 100.0}) {
+            SCOPED_TRACE(testing::Message() << "order " << n << ", shift " << shift);
+            auto a = qx::test::Reals(n * n, 5);
+            auto z = qx::test::Complexes(n * n, 6);
+            for (int i = 0; i < n; ++i) {
+                a[i * (n + 1)] += shift;
+                z[i * (n + 1)].im += shift;
+            }
+            ExpectInverted(a, n, MatrixLn2026_head, MatrixSqrt2026_head);
+            ExpectInverted(z, n, CxMatrixLn2026_head, CxMatrixSqrt2026_head);
+            // Definite: all eigenvalues are real, and so is all arithmetic.
+            for (int i = 0; i < n; ++i)
+                for (int j = 0; j <= i; ++j)
+                    a[i * n + j] = a[j * n + i] += i == j ? n : 0.0;
+            ExpectInverted(a, n, MatrixLn2026_head, MatrixSqrt2026_head);
+        }
+}
+
+TEST(MatrixFunctions, OfTheRevisionsOnTheCutAndWithoutRoot) {
+    CDB2DArray out;
+    const double pi = 0x1.921fb54442d18p+1;
+    for (const double beside : {0.0, -0.0, 1.0}) {
+        EXPECT_EQ(MatrixLn2026_head(DBL2DArray(2, 2, {-1, beside, 0, -4}).handle(), out.handle()),
+                  0);
+        EXPECT_EQ(out[0].im, pi);
+        EXPECT_EQ(out[3].im, pi);
+        EXPECT_DOUBLE_EQ(out[3].re, std::log(4.0));
+        EXPECT_NEAR(out[1].re, -beside * std::log(4.0) / 3, 1e-16);
+        EXPECT_EQ(CxMatrixSqrt2026_head(
+                      CDB2DArray(2, 2, {{-1, -0.0}, {beside, 0}, {0, 0}, {-4, -0.0}}).handle(),
+                      out.handle()),
+                  0);
+        EXPECT_EQ(out[0].im, 1.0);
+        EXPECT_EQ(out[3].im, 2.0);
+        EXPECT_DOUBLE_EQ(out[1].im, -beside / 3);
+    }
+    // Nothing is on the cut that is below it in a triangle.
+    EXPECT_EQ(CxMatrixLn2026_head(CDB2DArray(2, 2, {{-1, -1e-30}, {1, 0}, {0, 0}, {2, 0}}).handle(),
+                                  out.handle()),
+              0);
+    EXPECT_EQ(out[0].im, -pi);
+    // Two zeros with 1 between them have no root, and with nothing between them one.
+    for (const double between : {0.0, 1.0}) {
+        const DBL2DArray a(3, 3, {4, 0, 2, 0, 0, between, 0, 0, 0});
+        EXPECT_EQ(MatrixSqrt2026_head(a.handle(), out.handle()),
+                  between == 0.0 ? 0 : ErrDegenerateValue);
+        EXPECT_EQ(out.rows(), between == 0.0 ? 3 : 0);
+        EXPECT_EQ(MatrixLn2026_head(a.handle(), out.handle()), ErrDegenerateValue);
+    }
+    // Of rank 1, with rounding errors for the other eigenvalues.
+    for (const int n : {2, 7, 20}) {
+        const std::vector<double> ones(n * n, 1.0), expected(n * n, 1.0 / std::sqrt(n));
+        EXPECT_EQ(MatrixSqrt2026_head(DBL2DArray(n, n, ones).handle(), out.handle()), 0);
+        EXPECT_LT(RelativeDeviation(Contents(out), Exact(n, n, expected.data())), 1e-7) << n;
+    }
+    // Nearly so: eigenvalues +-1e-8.
+    EXPECT_EQ(
+        MatrixSqrt2026_head(DBL2DArray(2, 2, {1e-18, 1, 1e-18, 1e-18}).handle(), out.handle()),
+        WarnLowAccuracy);
+    EXPECT_EQ(MatrixLn2026_head(DBL2DArray(2, 2, {1, 1, 1, 1 + 0x1p-52}).handle(), out.handle()),
+              WarnLowAccuracy);
 }
 
 TEST(MatrixExponential, TakesADiagonalElementByElement) {
@@ -273,7 +400,46 @@ TEST(MatrixPower, OfANegativeExponentIsOneOfThePseudoInverse) {
 }
 
 template <class Elements, class Export>
-void ExpectInverted(const Elements &elements, int m, int n, Export invert) {
+void ExpectPowers(const Elements &elements, int n, int scale, Export raise) {
+    const auto a = Matrix(n, n, Scaled(elements, scale));
+    const Exact one = Exact(n, n, elements.data());
+    Exact expected = Exact::Identity(n);
+    auto out = Matrix(0, 0, Elements());
+    for (int power = 0; power <= 6; ++power) {
+        SCOPED_TRACE(testing::Message() << "power " << power << ", order " << n);
+        ASSERT_EQ(raise(a.handle(), power, out.handle()), 0);
+        EXPECT_LT(Deviation(Exact(n, n, Scaled(out.values(), -power * scale).data()), expected),
+                  4.0 * (power + 1));
+        ASSERT_EQ(raise(a.handle(), -power, out.handle()), 0);
+        const Exact inverse(n, n, Scaled(out.values(), power * scale).data());
+        EXPECT_LT((inverse * expected - Exact::Identity(n)).norm(),
+                  8 * (power + 1) * n * 0x1p-52L * inverse.norm() * expected.norm());
+        expected = expected * one;
+    }
+}
+TEST(MatrixPower, OfTheRevisionIsOneOfTheInverseAtAnySize) {
+    for (const int n : {1, 3, 12})
+        for (const int scale : {-150, 0, 150}) {
+            const auto &kind = MatrixKinds()[0];
+            ExpectPowers(RealMatrix(kind, n, n), n, scale, MatrixPower2026_head);
+            ExpectPowers(ComplexMatrix(kind, n, n), n, scale, CxMatrixPower2026_head);
+        }
+    DBL2DArray out;
+    const DBL2DArray singular(2, 2, {2, 2, 2, 2}), nearly(2, 2, {1, 1, 1, 1 + 0x1p-52});
+    EXPECT_EQ(MatrixPower2026_head(singular.handle(), -1, out.handle()), ErrSingularMatrix);
+    EXPECT_EQ(out.rows(), 0);
+    EXPECT_EQ(MatrixPower2026_head(nearly.handle(), -1, out.handle()), WarnLowAccuracy);
+    EXPECT_EQ(out[3], 0x1p52);
+    EXPECT_EQ(MatrixPower2026_head(singular.handle(), 0, out.handle()), 0);
+    EXPECT_EQ(out.values(), (std::vector<double>{1, 0, 0, 1}));
+    EXPECT_EQ(MatrixPower2026_head(DBL2DArray(1, 1, {-1.0}).handle(),
+                                   std::numeric_limits<int32_t>::min(), out.handle()),
+              0);
+    EXPECT_EQ(out[0], 1.0);
+}
+
+template <class Elements, class Export>
+void ExpectPseudoInverted(const Elements &elements, int m, int n, Export invert) {
     auto a = Matrix(m, n, elements);
     const double tolerance = -1.0;
     ErrorCode err;
@@ -287,8 +453,9 @@ TEST(PseudoInverse, MeetsItsFourConditions) {
     for (const auto &[m, n] : {std::pair{1, 1}, {4, 4}, {7, 3}, {3, 7}, {20, 12}})
         for (const int kind : {0, 2, 4, 10}) { // random, of rank 1, of rank 2, Frank
             SCOPED_TRACE(testing::Message() << m << " by " << n << ' ' << MatrixKinds()[kind].name);
-            ExpectInverted(RealMatrix(MatrixKinds()[kind], m, n), m, n, PseudoInverse_head);
-            ExpectInverted(ComplexMatrix(MatrixKinds()[kind], m, n), m, n, CxPseudoInverse_head);
+            ExpectPseudoInverted(RealMatrix(MatrixKinds()[kind], m, n), m, n, PseudoInverse_head);
+            ExpectPseudoInverted(ComplexMatrix(MatrixKinds()[kind], m, n), m, n,
+                                 CxPseudoInverse_head);
         }
 }
 TEST(PseudoInverse, OfTheRevisionMeetsThemAtAnyNorm) {

@@ -338,6 +338,25 @@ std::vector<Refuser<E>> Properties() {
              return Twin<E>(MatrixExp2026_head, CxMatrixExp2026_head)(a.handle(), out.handle());
          },
          LargestIsFine},
+        {"MatrixLn2026",
+         [](M a, M) {
+             CDB2DArray out;
+             return Twin<E>(MatrixLn2026_head, CxMatrixLn2026_head)(a.handle(), out.handle());
+         },
+         LargestIsFine},
+        {"MatrixSqrt2026",
+         [](M a, M) {
+             CDB2DArray out;
+             return Twin<E>(MatrixSqrt2026_head, CxMatrixSqrt2026_head)(a.handle(), out.handle());
+         },
+         LargestIsFine},
+        {"MatrixPower2026",
+         [](M a, M) {
+             M out;
+             return Twin<E>(MatrixPower2026_head, CxMatrixPower2026_head)(a.handle(), 0,
+                                                                          out.handle());
+         },
+         LargestIsFine},
         {"MatrixPower -1",
          [](M a, M) { return Twin<E>(MatrixPower_head, CxMatrixPower_head)(a.handle(), -1); }},
         {"Rank",
@@ -420,6 +439,13 @@ std::vector<Refuser<ElementType::DBL>> RealOnly() {
              return GenLinEqs2010_head(a.handle(), right.handle(), x.handle(), -1.0, work.handle());
          },
          RightSide | Rectangular},
+        {"Schur2026",
+         [](M a, M) {
+             M u;
+             CDBArray w;
+             return Schur2026_head(a.handle(), 1, 1, u.handle(), w.handle());
+         },
+         LargestIsFine},
         {"GenLinEqsbySVD2011",
          [](M a, M b) {
              DBLArray x, work, right = Elements(b);
