@@ -75,8 +75,8 @@ endfunction()
 # that become several; the baseline build tells the warnings that count), so that the linker cannot
 # choose one of these for the baseline; tests/widths_test.py looks at the objects.
 #
-# On 64-bit Windows g++ aligns the stack to 16 bytes and takes it for aligned to 32: the assembler makes
-# of every aligned move one that needs no alignment.
+# On 64-bit Windows the stack is aligned to 16 bytes, and g++ may take it for aligned to 32. Debian's does not;
+# the assembler makes of the aligned moves of any other ones that need no alignment.
 function(qx_compile_for_width family width options)
     set(objects ${family}_${width})
     add_library(${objects} OBJECT ${ARGN})
