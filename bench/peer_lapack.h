@@ -10,7 +10,7 @@ namespace qx::bench {
 // OpenBLAS, with its LAPACK, as a peer: loaded and not linked, so that none of its names meets
 // those of the module. One thread; OPENBLAS_CORETYPE=Haswell and the like choose its kernels, and
 // QX_OPENBLAS names another file than the one that Debian's packages install
-// (apt-get install libopenblas0-serial).
+// (tools/setup/native bench installs them).
 inline void *PeerLibrary() {
     static void *const library = [] {
         setenv("OPENBLAS_NUM_THREADS", "1", 1);

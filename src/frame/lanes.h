@@ -111,26 +111,26 @@ public:
         *reinterpret_cast<typename LaneVector<N>::inMemory *>(x) = v;
     }
 
-    // The first `count` elements, with zeros in the lanes behind; and these alone back to memory.
-    static QX_INLINE Lanes loadFirst(const DBL *x, std::ptrdiff_t count) {
+    // The first `some` elements, with zeros in the lanes behind; and these alone back to memory.
+    static QX_INLINE Lanes loadFirst(const DBL *x, std::ptrdiff_t some) {
 #ifdef __AVX512F__
         if constexpr (N == 8)
             return Lanes(
                 __builtin_ia32_loadupd512_mask(reinterpret_cast<const double *>(x), Vector{},
-                                               static_cast<unsigned char>((1U << count) - 1)));
+                                               static_cast<unsigned char>((1U << some) - 1)));
 #endif
         Vector first = {};
-        for (std::ptrdiff_t i = 0; i < count; ++i)
+        for (std::ptrdiff_t i = 0; i < some; ++i)
             first[i] = x[i];
         return Lanes(first);
     }
-    QX_INLINE void storeFirst(DBL *x, std::ptrdiff_t count) const {
+    QX_INLINE void storeFirst(DBL *x, std::ptrdiff_t some) const {
 #ifdef __AVX512F__
         if constexpr (N == 8)
             return __builtin_ia32_storeupd512_mask(reinterpret_cast<double *>(x), v,
-                                                   static_cast<unsigned char>((1U << count) - 1));
+                                                   static_cast<unsigned char>((1U << some) - 1));
 #endif
-        for (std::ptrdiff_t i = 0; i < count; ++i)
+        for (std::ptrdiff_t i = 0; i < some; ++i)
             x[i] = v[i];
     }
 

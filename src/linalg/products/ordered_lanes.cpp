@@ -279,6 +279,11 @@ QX_INLINE void AddToTile(std::ptrdiff_t k, typename Field::Factor factor, const 
     for (std::ptrdiff_t r = 0; r < Rows; ++r)
         sums[r].load(c + r * cStride);
     const DBL *at = a.data, *panel = b.data;
+    // The next tile's rows are far from each other in memory; so they are fetched ahead.
+    if constexpr (isWide)
+        for (std::ptrdiff_t r = 0; r < Rows; ++r)
+            for (std::ptrdiff_t v = 0; v < Field::vectors; ++v)
+                __builtin_prefetch(c + (Rows + r) * cStride + v * nativeLanes, 1);
     for (std::ptrdiff_t p = 0; p < k; ++p) {
         L row[Field::vectors];
         QX_UNROLLED
@@ -494,7 +499,8 @@ void AddLarge(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, Sign sign,
     }
 }
 
-// Without any copy: a real product whose operands fit in the second cache, b with its rows in one piece.
+// Without any copy: a real product whose operands fit in the second cache, b with its rows in one
+// piece.
 template <class How>
 void AddInPlace(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, const RealOperand &a,
                 const RealOperand &b, DBL *c, std::ptrdiff_t cStride) {
@@ -506,9 +512,11 @@ void AddInPlace(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, const Real
         });
     }
 }
-bool AddIfInPlace(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, RealFactor factor,
-                  const RealOperand &a, const RealOperand &b, DBL *c, std::ptrdiff_t cStride) {
-    const Sign sign = Real::signOf(factor);
+template <class Field>
+bool AddIfInPlace(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k,
+                  typename Field::Factor factor, const typename Field::Operand &a,
+                  const typename Field::Operand &b, DBL *c, std::ptrdiff_t cStride) {
+    const Sign sign = Field::signOf(factor);
     if (b.across != 1 || sign == Sign::scaled || m * k > mostInPlace || n * k > mostInPlace)
         return false;
     if (sign == Sign::plus)
@@ -545,7 +553,7 @@ namespace narrower = QX_WIDTH;
 void AddProductReal(std::ptrdiff_t m, std::ptrdiff_t n, std::ptrdiff_t k, RealFactor factor,
                     RealOperand a, RealOperand b, DBL *c, std::ptrdiff_t cStride) {
     if constexpr (isWide)
-        if (AddIfInPlace(m, n, k, factor, a, b, c, cStride))
+        if (AddIfInPlace<Real>(m, n, k, factor, a, b, c, cStride))
             return;
     if (AddIfLarge<Real>(m, n, k, factor, a, b, c, cStride))
         return;
