@@ -109,18 +109,18 @@ QX_API ErrorCode MatrixSqrtH(QX_IN DBL2D a, QX_OUT CDB2D out);
 /** As MatrixSqrt_head, for complex elements; nothing is dropped. */
 QX_API int32_t CxMatrixSqrt_head(QX_INOUT CDB2D a, QX_OUT ErrorCode *err);
 
-/** The principal square root of the square matrix a, whose eigenvalues have no negative real parts.
+/** The principal square root of the square matrix a: that with eigenvalues of no negative real part.
     Through the Schur form, whose triangle is taken by halves; of a diagonal matrix element by
     element. Elements may be of any size: no test is against an absolute number. Eigenvalues on the
     negative axis (as in MatrixLn2026_head) have the root with +i; where a is real and has none,
-    imaginary parts are 0. Root times root gives a back to about n 2.2e-16 |root|^2. A singular a has
-    a root where its eigenvalue 0 belongs to no more than zeros, which rounding errors decide: (0, 1;
-    0, 0) has none. A. Bjorck and S. Hammarling, "A Schur method for the square root of a matrix",
-    1983; E. Deadman, N. J. Higham and R. Ralha, "Blocked Schur algorithms for computing the matrix
-    square root", 2012.
+    imaginary parts are 0. Root times root gives a back to about n 2.2e-16 |root|^2. Of a singular a a
+    root is found unless two eigenvalues 0 are coupled in the Schur form by more than rounding errors,
+    as in (0, 1; 0, 0), which has none; roots that are no functions of a are not looked for. A.
+    Bjorck and S. Hammarling, "A Schur method for the square root of a matrix", 1983; E. Deadman,
+    N. J. Higham and R. Ralha, "Blocked Schur algorithms for computing the matrix square root", 2012.
     Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrOutOfMemory (no memory, or
     the host refuses the resize), ErrNonFiniteInput (an element is not finite), ErrIterationLimit (the
-    eigenvalue iteration did not converge), ErrDegenerateValue (there is no root, or it overflows),
+    eigenvalue iteration did not converge), ErrDegenerateValue (no root was found, or it overflows),
     WarnLowAccuracy (|root|^2 / |a| in Frobenius norms is above 1e8, so that half of the digits or
     more are lost, and a not triangular).
     NaN: a refused with ErrNonFiniteInput. */

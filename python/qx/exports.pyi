@@ -1290,11 +1290,11 @@ def CxMatrixSqrt_head(a: ArrayLike) -> NDArray[np.complex128]:
 
 
 def MatrixSqrt2026_head(a: ArrayLike) -> NDArray[np.complex128]:
-    """The principal square root of the square matrix a, whose eigenvalues have no negative real parts."""
+    """The principal square root of the square matrix a: that with eigenvalues of no negative real part."""
 
 
 def CxMatrixSqrt2026_head(a: ArrayLike) -> NDArray[np.complex128]:
-    """As MatrixSqrt2026_head, for complex elements. The principal square root of the square matrix a, ..."""
+    """As MatrixSqrt2026_head, for complex elements. The principal square root of the square matrix a: ..."""
 
 
 def MatrixPower_head(a: ArrayLike, power: int) -> NDArray[np.float64]:

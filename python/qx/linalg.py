@@ -1064,7 +1064,7 @@ def sqrtm(a: ArrayLike) -> NDArray[Any]:
     numpy.linalg.LinAlgError
         If a is not square.
     ValueError
-        If a is empty or has an element that is not finite, or there is no root.
+        If a is empty or has an element that is not finite, or no root is found.
 
     Examples
     --------
