@@ -2081,6 +2081,10 @@ def QX_Elliptic1_85(m: float | ArrayLike, phi: float | ArrayLike, selector: int 
     """As QX_Elliptic1, with a selector for what a NaN says there: 1 complete, otherwise incomplete. ..."""
 
 
+def QX_Elliptic1_2026(m: float | ArrayLike, phi: float | ArrayLike, selector: int | ArrayLike) -> float | NDArray[Any]:
+    """As QX_Elliptic1_85, with F(phi, 1) = ln((1 + sin phi) / cos phi) to 3 eps: below a quarter of pi ..."""
+
+
 def QX_Elliptic2(m: float | ArrayLike, phi: float | ArrayLike) -> float | NDArray[Any]:
     """Elliptic integral of the second kind: complete, E(m), where phi is NaN, else E(phi, m), the ..."""
 
@@ -2145,12 +2149,24 @@ def QX_Gauss_2011(x: float | ArrayLike, a: float | ArrayLike, b: float | ArrayLi
     """As QX_Gauss, with Pfaff's transformation for all x < 0.2, where its argument lies in [-0.25, ..."""
 
 
+def QX_Gauss_2026(x: float | ArrayLike, a: float | ArrayLike, b: float | ArrayLike, c: float | ArrayLike) -> float | NDArray[Any]:
+    """As QX_Gauss_2011, for all x <= 1 and region by region. Gauss's hypergeometric function F(a, b; ..."""
+
+
 def QX_Kummer(x: float | ArrayLike, a: float | ArrayLike, b: float | ArrayLike) -> float | NDArray[Any]:
     """Kummer's confluent hypergeometric function M(a, b, x) = 1F1, the sum of (a)_k / ((b)_k k!) x^k."""
 
 
+def QX_Kummer_2026(x: float | ArrayLike, a: float | ArrayLike, b: float | ArrayLike) -> float | NDArray[Any]:
+    """As QX_Kummer, region by region: for |x| >= 30 both sums of the asymptotic form where their ..."""
+
+
 def QX_Tricomi(x: float | ArrayLike, a: float | ArrayLike, b: float | ArrayLike) -> float | NDArray[Any]:
     """Tricomi's confluent hypergeometric function U(a, b, x)."""
+
+
+def QX_Tricomi_2026(x: float | ArrayLike, a: float | ArrayLike, b: float | ArrayLike) -> float | NDArray[Any]:
+    """As QX_Tricomi, region by region: the asymptotic sum where its smallest term is below 9e-15; for ..."""
 
 
 def QX_Erf(x: float | ArrayLike) -> float | NDArray[Any]:

@@ -54,9 +54,10 @@ Estimated NearOne(const GaussArguments &p, const Point &point) {
     const Extended off = s - Whole(whole);
     if (std::fabs(off.high) >= kAside)
         return Connection(p, s, point);
+    // b moves, since F has no poles in b
     const auto beside = [&](double aside) {
         const Extended moved = Whole(whole) + Whole(aside);
-        return Connection({p.a, p.b, p.a + p.b + moved}, moved, point);
+        return Connection({p.a, p.c - p.a - moved, p.c}, moved, point);
     };
     return Between(beside(-kAside), beside(kAside), off.high / kAside);
 }

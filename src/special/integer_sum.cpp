@@ -13,7 +13,7 @@ namespace {
 constexpr int kWordBits = 32;
 constexpr int kMostWords = 64;       // of a term
 constexpr int kFactorWords = 8;      // of a parameter, with the number of the term added
-constexpr double kMostWork = 100000; // words of all terms, a few milliseconds
+constexpr double kMostWork = 200000; // words of all terms, a few milliseconds
 constexpr int kMostBelow = 5;        // of them behind the point
 constexpr double kParameterLimit = 0x1p40;
 

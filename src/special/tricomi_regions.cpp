@@ -14,7 +14,7 @@ namespace qx {
 namespace {
 
 constexpr double kGood = 40 * kEpsilon;
-constexpr double kGoodRecurrence = 2e-13;
+constexpr double kGoodRecurrence = 5e-13;
 constexpr double kGoodConnection = 4e-14;
 constexpr double kPlainError = 12 * kEpsilon;
 constexpr double kGoodParts = 1e-27;
@@ -23,7 +23,7 @@ constexpr double kConnectionFirst = 0.2;
 constexpr double kPlainBelow = 3, kPlainDistance = 0.05;
 constexpr double kPlain = 20; // parameters up to which the functions of doubles serve
 constexpr double kAside = 0x1p-32;
-constexpr int kMostTerms = 20000;
+constexpr int kMostTerms = 40000;
 constexpr int kMostSteps = 3000;
 constexpr double kBig = 0x1p300;
 constexpr int kBigExponent = 300;
@@ -192,7 +192,9 @@ Estimated ByRecurrences(Extended a, Extended b, double x) {
     if (!u.isKnown)
         return none;
     const Number first = Of<Number>(a), point = Of<Number>(Whole(x));
-    double scale = std::sqrt(std::fabs(a.high * (a.high - second.high + 1)));
+    // Below 0 U oscillates in a with this change of phase from one step to the next.
+    const double phase = a.high < 0 ? std::sqrt(x / (std::fabs(a.high) + x)) : 1;
+    double scale = std::sqrt(std::fabs(a.high * (a.high - second.high + 1))) / phase;
     if (up > 0) {
         const Number e = first * (u.at - Of<Number>(a - second + Whole(1)) * u.above) / point;
         u.above = e;
@@ -215,7 +217,7 @@ Estimated ByRecurrences(Extended a, Extended b, double x) {
     }
     const double size = std::fabs(Leading(u.at));
     const double amplitude = size + scale * std::fabs(Leading(u.above));
-    double weight = 8 + std::sqrt(static_cast<double>(u.steps)) + up;
+    double weight = (8 + std::sqrt(static_cast<double>(u.steps)) + up) / phase;
     if (up > 0 && a.high < 0) // the part that grows has a factor 1 / gamma(a)
         weight += 0.1 * weight / std::fabs((a - Whole(std::rint(a.high))).high);
     return {u.unit * WideOf(Pair(u.at)), 4 * weight * kPrecision<Number> * amplitude / size};
@@ -315,7 +317,7 @@ Estimated ByRegion(Extended a, Extended b, double x) {
     const bool isTurned = b.high < 1;
     const Extended first = isTurned ? a - b + Whole(1) : a;
     Estimated connected = {kOne, kInfinity};
-    if (x < kConnectionFirst && !Ends(first))
+    if (x < (a.high < 0 ? kConnectionBelow : kConnectionFirst) && !Ends(first))
         connected = Connected(a, b, x);
     else if (x < kPlainBelow && std::fabs(b.high - std::rint(b.high)) > kPlainDistance)
         connected = PlainConnection(a.high, b.high, x);

@@ -11,7 +11,7 @@ namespace qx {
 
 namespace {
 
-constexpr double kMostDegrees = 1e9;
+constexpr double kMostDegrees = 1e6;
 constexpr double kNearest = 1e-100, kFarthest = 1e5;
 constexpr double kCentralTo = 0.9;
 constexpr double kLargestLogarithm = 640.0; // of 1 over the tail

@@ -3,7 +3,7 @@
 
 namespace qx {
 
-// Student's distribution for degrees n from 1 to 1e9 and t from 1e-100 to 1e5, where the tail is above
+// Student's distribution for degrees n from 1 to 1e6 and t from 1e-100 to 1e5, where the tail is above
 // 1e-280: `isKnown` is false elsewhere. Each value within 4 eps.
 //
 // t <= 0.9: P(0 < T < t) by a series of positive terms in t^2 / (n + t^2). t > 0.9: P(T > t) by the continued
@@ -20,7 +20,7 @@ struct StudentTail {
 };
 StudentTail StudentTailAt(double t, double n);
 
-// t > 0 with P(T > t) = p, 1e-250 <= p < 1/2, n from 1 to 1e9; NaN where Newton's method from the
+// t > 0 with P(T > t) = p, 1e-250 <= p < 1/2, n from 1 to 1e6; NaN where Newton's method from the
 // start of G. W. Hill (Algorithm 396: Student's t-quantiles, 1970) leaves the range of StudentTailAt.
 double StudentUpperPoint(double p, double n, double normalPoint);
 

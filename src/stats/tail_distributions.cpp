@@ -274,7 +274,7 @@ double StudentPoint(double p, bool isUpper, double dof) {
     if (p == 0.5)
         return 0.0;
     double t = kNaN;
-    if (dof >= 1.0 && dof < kMostDegrees && p > kLeastTail)
+    if (dof >= 1.0 && p > kLeastTail)
         t = StudentUpperPoint(p, dof, UpperNormalPoint(p));
     if (!std::isnan(t))
         return isUpper ? t : -t;

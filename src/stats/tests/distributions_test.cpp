@@ -236,6 +236,25 @@ TEST(DistributionTails, InversesReturnTheArgument) {
     EXPECT_GT(checked, 90);
 }
 
+// Degrees 1 and 2 have closed forms without a difference; on both sides of the methods' threshold.
+TEST(DistributionTails, StudentAgreesWithClosedForms) {
+    for (double t = 1e-3; t < 1e7; t *= 1.05) {
+        const double root = std::sqrt(2 + t * t);
+        const double cauchy = std::atan(1 / t) / std::numbers::pi, second = 1 / (root * (root + t));
+        EXPECT_NEAR(Revised("t", {t, 1}, 1), cauchy, 5 * eps * cauchy) << t;
+        EXPECT_NEAR(Revised("t", {t, 2}, 1), second, 6 * eps * second) << t;
+        const double rounding = cauchy * std::numbers::pi * (1 + t * t) / t; // of the probability
+        EXPECT_NEAR(Revised("it", {cauchy, 1}, 1) / t, 1, (4 + 4 * rounding) * eps) << t;
+        EXPECT_NEAR(Revised("t", {t, 2}, 4), 1 / (root * root * root),
+                    6 * eps / (root * root * root));
+    }
+    for (const double n : {1.0, 5.5, 50.0, 1e4, 1e6, 1e9}) {
+        const double below = Revised("t", {0.9, n}, 1);
+        const double above = Revised("t", {std::nextafter(0.9, 1), n}, 1);
+        EXPECT_NEAR(below, above, 5 * eps * below) << n;
+    }
+}
+
 TEST(DistributionTails, ReachLimitsOfTheDegrees) {
     for (const double t : {-30.0, -1.0, 0.25, 8.0})
         for (const int32_t what : {0, 1, 2, 3, 4}) {
