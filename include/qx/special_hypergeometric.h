@@ -96,11 +96,12 @@ QX_API void QX_Kummer_2026(double x, double a, double b, QX_OUT DBL *value);
     NaN: x, a, b in all results. */
 QX_API void QX_Tricomi(double x, double a, double b, QX_OUT DBL *value);
 
-/** As QX_Tricomi, region by region: the asymptotic sum where its smallest term is below 9e-15; for b < 1
-    the same function of a - b + 1 and 2 - b (13.1.29); for x < 1 the connection with M in two doubles,
-    next to an integer b the line between the values at 2^-32 on its sides; else recurrences, downwards
-    in a from where U is as good as 0, in a form without a difference, and upwards in b, in double
-    precision or, near a zero, in two doubles.
+/** As QX_Tricomi, region by region: the asymptotic sum where its smallest term is below 9e-15; for x < 0.2,
+    and x < 1 where a < 0, the connection with M, in two doubles where it cancels, next to an integer b
+    the line between the values at 2^-32 on its sides; for b < 1 the same function of a - b + 1 and
+    2 - b (13.1.29); for a = -n a multiple of M(-n, b, x); else recurrences, downwards in a from where U
+    is as good as 0, in a form without a difference, and upwards in b, in double precision or, near a
+    zero, in two doubles.
 
     With |a|, |b| <= 100, x in [1e-3, 100]: on 10^6 points no NaN and no error above @U@; some
     microseconds, up to a few milliseconds.

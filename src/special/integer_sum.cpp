@@ -14,6 +14,7 @@ constexpr int kWordBits = 32;
 constexpr int kMostWords = 64;       // of a term
 constexpr int kFactorWords = 8;      // of a parameter, with the number of the term added
 constexpr double kMostWork = 200000; // words of all terms, a few milliseconds
+constexpr double kMostLargest = 1e7; // log2 of the largest term
 constexpr int kMostBelow = 5;        // of them behind the point
 constexpr double kParameterLimit = 0x1p40;
 
@@ -306,8 +307,8 @@ Estimated IntegerSum(const HyperTerms &terms, double largest, int bits) {
     const Estimated none = {{{kNaN, 0}, 0}, kNaN};
     const int words = bits / kWordBits + 2;
     Parameter a, b, c, x;
-    if (words > kMostWords - 4 || !a.set(terms.a) || !c.set(terms.c) || !x.set(terms.x) ||
-        (terms.hasB && !b.set(terms.b)))
+    if (!(largest < kMostLargest) || words > kMostWords - 4 || !a.set(terms.a) || !c.set(terms.c) ||
+        !x.set(terms.x) || (terms.hasB && !b.set(terms.b)))
         return none;
     const int top = static_cast<int>(std::ceil((largest + 1) / kWordBits)) + 1;
     Accumulator sum(words + 3, top - words - 1);

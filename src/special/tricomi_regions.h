@@ -6,9 +6,12 @@ namespace qx {
 // U(a, b, x), x >= 0. In this order:
 //
 //   the asymptotic sum (13.7.3 of the DLMF) where its smallest term is below 9e-15, and where it ends
+//   x < 0.2, and x < 1 where a < 0: the two M of 13.2.42, with gammas and sums in two doubles; at b
+//          within 2^-32 of an integer the value between those at 2^-32 on both its sides, whose error
+//          is of second order. In double precision, to x = 3, for parameters to 20 and b away from
+//          integers where the two cancel little
 //   b < 1: x^(1-b) times U(a - b + 1, 2 - b, x) (13.2.40)
-//   x < 1: the two M of 13.2.42, with gammas and sums in two doubles; at b within 2^-32 of an integer
-//          the value between those at 2^-32 on both its sides, whose error is of second order
+//   a = 0, -1, -2, ...: (-1)^n (b)_n M(-n, b, x)
 //   otherwise recurrences, in double precision and, near a zero, in two doubles: with b <= x + 1
 //          downwards in a from where U is as good as 0, in a form without a difference, normalised by
 //          the sum of (a - b + 1)_n (a)_n U(a + n, b, x) / n! = x^(-a); to larger b upwards

@@ -8,7 +8,7 @@ namespace qx {
 // value 2^exponent: the digits of two doubles beyond the range of one, for factors of a product that
 // is itself a double. An exponent beyond 2^30 either way is not kept apart from infinity and 0.
 struct Wide {
-    Extended value; // 0, or of modulus 1/2 to 1 (ExtendedOf: any)
+    Extended value; // 0, or of modulus 1/2 to 1
     int exponent;
 
     bool isZero() const { return value.high == 0; }
