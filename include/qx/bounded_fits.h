@@ -137,54 +137,53 @@ QX_API ErrorCode BoundLogFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w
 
 /** As BoundExpFit_head, for the peak or dip y = a exp(-0.5 ((x - m) / s)^2) + c; s comes back
     without its sign. Bounds of bad length are left out without a word, and so is a guess that does
-    not begin with a finite value. Without a guess the fit starts at the peak on the lowest level of
-    the data or at the dip in the highest: of 510 exact peaks and dips of all widths, within bounds
-    that hold them, 90 are missed, with the code 0 or a failure. BoundGaussianFit2026_head finds
-    all of them. Codes: ErrSizeMismatch (x or w does not fit y),
-    ErrNaNInData (a bound is NaN), ErrFitPointsTooFew (fewer samples than free coefficients),
-    ErrOutOfMemory (no memory), ErrInvalidSelector (method is above 2), ErrNonFiniteInput (a weight
-    is NaN or infinite), ErrTooFewWeights (fewer weights other than 0 than coefficients),
-    ErrNoUsableFit (no guess, and neither a peak nor a dip to start from), ErrFitStartValues (s
-    starts at 0), ErrNaNInData (the residuals at the start are NaN), ErrNonFiniteInput (the cost is
-    NaN or infinite at the start and at the next point), ErrSingularMatrix (a step is not
-    determined), ErrBoundsCrossed (a lower bound is above its upper one), WarnFitIncomplete (guess
-    is too short).
+    not begin with a finite value. Without a guess the fit starts at the peak on the lowest level
+    of the data or at the dip in the highest: of 510 exact peaks and dips of all widths, within
+    bounds that hold them, 90 are missed, with the code 0 or a failure. BoundGaussianFit2026_head
+    finds all of them. Codes: ErrSizeMismatch (x or w does not fit y), ErrNaNInData (a bound is
+    NaN), ErrFitPointsTooFew (fewer samples than free coefficients), ErrOutOfMemory (no memory),
+    ErrInvalidSelector (method is above 2), ErrNonFiniteInput (a weight is NaN or infinite),
+    ErrTooFewWeights (fewer weights other than 0 than coefficients), ErrNoUsableFit (no guess, and
+    neither a peak nor a dip to start from), ErrFitStartValues (s starts at 0), ErrNaNInData (the
+    residuals at the start are NaN), ErrNonFiniteInput (the cost is NaN or infinite at the start
+    and at the next point), ErrSingularMatrix (a step is not determined), ErrBoundsCrossed (a lower
+    bound is above its upper one), WarnFitIncomplete (guess is too short).
     NaN: y, x refused with ErrNonFiniteInput or refused with ErrNoUsableFit; w refused with
-    ErrNonFiniteInput; tolerance in no result; guess refused with ErrNonFiniteInput or in no result;
-    lower, upper refused with ErrNaNInData. */
+    ErrNonFiniteInput; tolerance in no result; guess refused with ErrNonFiniteInput or in no
+    result; lower, upper refused with ErrNaNInData. */
 QX_API ErrorCode BoundGaussianFit_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w,
                                        double tolerance, QX_INOUT int32_t *iterations,
                                        QX_IN DBL1D guess, QX_IN DBL1D lower, QX_IN DBL1D upper,
                                        uint16_t method, QX_OUT double *a, QX_OUT double *m,
                                        QX_OUT double *s, QX_OUT double *c, QX_OUT double *mse);
 
-/** As BoundGaussianFit_head, from starts at every scale, of which the best are fitted and the least
-    cost counts: peaks and dips from a fraction of the distance of two samples to several times the
-    range of x, inside and beyond it, with the best height and level of each in closed form (G. H.
-    Golub, V. Pereyra, "The differentiation of pseudo-inverses and nonlinear least squares problems
-    whose variables separate", 1973). A guess is the only start. Least squares go by the trust region of
-    NonlinearFit2026, within the bounds from the first step on: tolerance is the part of itself by
-    which a coefficient may still move at the end, 0 or below for as far as rounding errors allow. In
-    the other norms the elder's steps start from there and from the least squares of the medians of
-    each five neighbours, by bisquare from the least absolute residuals; the least sum counts, by
-    bisquare the least median (P. J. Rousseeuw, "Least median of squares regression", 1984), and the
-    tolerance is the elder's. *iterations is the limit from a start, 2000 where it
-    is 0 or below. Bounds of bad length are refused. Where x determine no peak, one of those that fit
-    as well comes back with the warning.
-    Codes: ErrSizeMismatch (x or w does not fit y), ErrSizesDisagree (lower or upper have one to three
-    elements, or they differ in length), ErrNaNInData (a bound is NaN), ErrFitPointsTooFew (fewer
-    samples than free coefficients), ErrInvalidSelector (method is above 2), ErrBoundsCrossed (a lower
-    bound is above its upper one), ErrNonFiniteInput (x, y, w or guess is not finite),
-    ErrTooFewWeights (fewer weights other than 0 than free coefficients), ErrFitStartValues (s is
-    fixed at 0, or its guess is 0), ErrOutOfMemory (no memory), ErrNoUsableFit (no start has finite
-    squares), ErrNonFiniteFunction (the squares at the guess are not finite), ErrIterationLimit (least
-    squares reach the limit; all outputs are valid), ErrNaNInData (a residual is NaN in another norm),
-    ErrNonFiniteInput (a cost in another norm is not finite), ErrSingularMatrix (a step in another norm
-    is not determined), WarnRankDeficient (least squares do not determine each free coefficient),
-    WarnLowAccuracy (they end before the coefficients are at rest to 7 digits), WarnFitIncomplete
-    (guess is too short).
-    NaN: y, x, w, guess refused with ErrNonFiniteInput; tolerance in no result; lower, upper refused
-    with ErrNaNInData. */
+/** As BoundGaussianFit_head, from starts at every scale, of which the best are fitted and the
+    least cost counts: peaks and dips from a fraction of the distance of two samples to several
+    times the range of x, inside and beyond it, with the best height and level of each in closed
+    form (G. H. Golub, V. Pereyra, "The differentiation of pseudo-inverses and nonlinear least
+    squares problems whose variables separate", 1973). A guess is the only start. Least squares go
+    by the trust region of NonlinearFit2026, within the bounds from the first step on: tolerance is
+    the part of itself by which a coefficient may still move at the end, 0 or below for as far as
+    rounding errors allow. In the other norms the elder's steps start from there and from the least
+    squares of the medians of each five neighbours, by bisquare from the least absolute residuals;
+    the least sum counts, by bisquare the least median (P. J. Rousseeuw, "Least median of squares
+    regression", 1984), and the tolerance is the elder's. *iterations is the limit from a start,
+    2000 where it is 0 or below. Bounds of bad length are refused. Where x determine no peak, one
+    of those that fit as well comes back with the warning.
+    Codes: ErrSizeMismatch (x or w does not fit y), ErrSizesDisagree (lower or upper have one to
+    three elements, or they differ in length), ErrNaNInData (a bound is NaN), ErrFitPointsTooFew
+    (fewer samples than free coefficients), ErrInvalidSelector (method is above 2),
+    ErrBoundsCrossed (a lower bound is above its upper one), ErrNonFiniteInput (x, y, w or guess is
+    not finite), ErrTooFewWeights (fewer weights other than 0 than free coefficients),
+    ErrFitStartValues (s is fixed at 0, or its guess is 0), ErrOutOfMemory (no memory),
+    ErrNoUsableFit (no start has finite squares), ErrNonFiniteFunction (the squares at the guess
+    are not finite), ErrIterationLimit (least squares reach the limit; all outputs are valid),
+    ErrNaNInData (a residual is NaN in another norm), ErrNonFiniteInput (a cost in another norm is
+    not finite), ErrSingularMatrix (a step in another norm is not determined), WarnRankDeficient
+    (least squares do not determine each free coefficient), WarnLowAccuracy (they end before the
+    coefficients are at rest to 7 digits), WarnFitIncomplete (guess is too short).
+    NaN: y, x, w, guess refused with ErrNonFiniteInput; tolerance in no result; lower, upper
+    refused with ErrNaNInData. */
 QX_API ErrorCode BoundGaussianFit2026_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w,
                                            double tolerance, QX_INOUT int32_t *iterations,
                                            QX_IN DBL1D guess, QX_IN DBL1D lower, QX_IN DBL1D upper,

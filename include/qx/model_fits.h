@@ -105,16 +105,16 @@ QX_API ErrorCode LogFitCoef_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w, do
 /** y = a exp(-((x - c) / s)^2 / 2), a peak up or down, by steepest descent with halved steps from
     the guess (a, c, s), or from the logarithms of what lies above a tenth of the peak; its values
     take the place of y. *iterations counts the trials. Steepest descent converges slowly where the
-    sizes of a, c and s differ much, and ends by the tolerance then; with a tolerance of nearly 0 it
-    may creep on for millions of trials, up to the limit. x from 1e154 on overflow: s is infinite,
-    with the code 0. A guess that is not finite counts as none. A peak that alone lies above a tenth
-    of its height is taken through three points, and *iterations is 0. Of 510 exact peaks and dips of
-    all widths 242 are missed by more than 1e-6 of a coefficient; GaussianPeakFit2026_head finds
-    all of them.
+    sizes of a, c and s differ much, and ends by the tolerance then; with a tolerance of nearly 0
+    it may creep on for millions of trials, up to the limit. x from 1e154 on overflow: s is
+    infinite, with the code 0. A guess that is not finite counts as none. A peak that alone lies
+    above a tenth of its height is taken through three points, and *iterations is 0. Of 510 exact
+    peaks and dips of all widths 242 are missed by more than 1e-6 of a coefficient;
+    GaussianPeakFit2026_head finds all of them.
     Codes: ErrSizeMismatch (the arrays differ in length), ErrFewerThanThree (less than three
-    samples), ErrNonFiniteInput (a weight is NaN), ErrTooFewWeights (less than three weights are not
-    0), ErrNonFiniteInput (an x is not finite), ErrFitStartValues (the deviation to start from is 0,
-    or a lone peak has no neighbour of its sign on a side), ErrOutOfMemory (no memory),
+    samples), ErrNonFiniteInput (a weight is NaN), ErrTooFewWeights (less than three weights are
+    not 0), ErrNonFiniteInput (an x is not finite), ErrFitStartValues (the deviation to start from
+    is 0, or a lone peak has no neighbour of its sign on a side), ErrOutOfMemory (no memory),
     WarnFitIncomplete (the guess has neither no values nor three).
     NaN: y refused with ErrFitStartValues or in some results; x, w refused with ErrNonFiniteInput;
     tolerance, floor in no result. */
@@ -133,13 +133,14 @@ QX_API ErrorCode GaussianPeakFitCoef_head(QX_IN DBL1D y, QX_IN DBL1D x, QX_IN DB
     BoundGaussianFit2026_head, whose tolerance and limit of the iterations this one has. A guess of
     another length than three is as the elder's, and one of three the only start. floor is not
     looked at.
-    Codes: ErrSizeMismatch (the arrays differ in length), ErrFitPointsTooFew (less than three samples),
-    ErrNonFiniteInput (x, y, w or guess is not finite), ErrTooFewWeights (less than three weights are
-    not 0), ErrFitStartValues (the guess of s is 0), ErrOutOfMemory (no memory), ErrNoUsableFit (no
-    start has finite squares), ErrNonFiniteFunction (the squares at the guess are not finite),
-    ErrIterationLimit (the limit is reached; all outputs are valid), WarnRankDeficient (the samples do
-    not determine each coefficient), WarnLowAccuracy (the fit ends before the coefficients are at rest
-    to 7 digits), WarnFitIncomplete (the guess has neither no values nor three).
+    Codes: ErrSizeMismatch (the arrays differ in length), ErrFitPointsTooFew (less than three
+    samples), ErrNonFiniteInput (x, y, w or guess is not finite), ErrTooFewWeights (less than three
+    weights are not 0), ErrFitStartValues (the guess of s is 0), ErrOutOfMemory (no memory),
+    ErrNoUsableFit (no start has finite squares), ErrNonFiniteFunction (the squares at the guess
+    are not finite), ErrIterationLimit (the limit is reached; all outputs are valid),
+    WarnRankDeficient (the samples do not determine each coefficient), WarnLowAccuracy (the fit
+    ends before the coefficients are at rest to 7 digits), WarnFitIncomplete (the guess has neither
+    no values nor three).
     NaN: y, x, w, guess refused with ErrNonFiniteInput; tolerance, floor in no result. */
 QX_API ErrorCode GaussianPeakFit2026_head(QX_INOUT DBL1D y, QX_IN DBL1D x, QX_IN DBL1D w,
                                           double tolerance, QX_IN DBL1D guess, QX_OUT double *a,

@@ -411,6 +411,34 @@ TEST(ModelFits, GaussianPeaksAreLeastSquares) {
     }
 }
 
+// Exact peaks and dips from narrower than the distance of samples to wider than their range, in and
+// beyond it.
+TEST(ModelFits, TheRevisionFindsPeaksOfAnyWidth) {
+    int missed = 0;
+    for (const int n : {12, 40, 200})
+        for (const double s : {0.7 / n, 2.0 / n, 0.1, 0.4, 1.5})
+            for (const double c : {-0.3 * s, 0.03, 0.5, 0.93, 1 + 0.3 * s})
+                for (const double a : {-3.0, 1e-30}) {
+                    const Samples x = Evenly(n, 0, 1), truth = {a, c, s};
+                    const DBLArray y(Values(Peak, truth, x, 0.0));
+                    Samples p(3);
+                    double mse;
+                    int32_t iterations = 0;
+                    if (!(MeanSquare({}, y.values()) > 1e-3 * a * a / n))
+                        continue; // it lies between the samples
+                    const ErrorCode code = GaussianPeakFit2026_head(
+                        y.handle(), DBLArray(x).handle(), DBLArray(Samples{}).handle(), 0.0,
+                        DBLArray(Samples{}).handle(), &p[0], &p[1], &p[2], &mse, &iterations, 0.0);
+                    EXPECT_EQ(code, 0) << n << " " << s << " " << c;
+                    for (std::size_t j = 0; j < 3; ++j)
+                        EXPECT_NEAR(p[j] / truth[j], 1, 1e-6) << n << " " << s << " " << c;
+                    const Fitted elder = FitPeak(x, Values(Peak, truth, x, 0.0),
+                                                 {.iterations = 5000});
+                    missed += elder.code != 0 || std::fabs(elder.p[2] / s - 1) > 1e-6;
+                }
+    EXPECT_GT(missed, 30) << "the elder finds them, too";
+}
+
 TEST(ModelFits, EstimatesOfPeaks) {
     const auto estimate = [](const Samples &x, const Samples &y) {
         return FitPeak(x, y, {.iterations = -1});
