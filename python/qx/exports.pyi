@@ -1,6 +1,6 @@
 """Every export as a function. Written by qx.stubs from the catalogue."""
 
-from collections.abc import Mapping
+from collections.abc import Callable, Mapping
 from typing import Any
 
 import numpy as np
@@ -91,6 +91,10 @@ def BoundLogFit_head(y: ArrayLike, x: ArrayLike, w: ArrayLike, base: float, iter
 
 def BoundGaussianFit_head(y: ArrayLike, x: ArrayLike, w: ArrayLike, tolerance: float, iterations: int, guess: ArrayLike, lower: ArrayLike, upper: ArrayLike, method: int) -> tuple[NDArray[np.float64], int, float, float, float, float, float]:
     """As BoundExpFit_head, for the peak or dip y = a exp(-0.5 ((x - m) / s)^2) + c; s comes back ..."""
+
+
+def BoundGaussianFit2026_head(y: ArrayLike, x: ArrayLike, w: ArrayLike, tolerance: float, iterations: int, guess: ArrayLike, lower: ArrayLike, upper: ArrayLike, method: int) -> tuple[NDArray[np.float64], int, float, float, float, float, float]:
+    """As BoundGaussianFit_head, from starts at every scale, of which the best are fitted and the least ..."""
 
 
 def NumerIntegration_head(x: ArrayLike, dt: float, rule: int) -> float:
@@ -1545,6 +1549,10 @@ def GaussianPeakFitCoef_head(y: ArrayLike, x: ArrayLike, w: ArrayLike, tolerance
     """As GaussianPeakFit_head, for the coefficients alone. y = a exp(-((x - c) / s)^2 / 2), a peak up ..."""
 
 
+def GaussianPeakFit2026_head(y: ArrayLike, x: ArrayLike, w: ArrayLike, tolerance: float, guess: ArrayLike, iterations: int, floor: float) -> tuple[NDArray[np.float64], float, float, float, float, int]:
+    """As GaussianPeakFit_head, from starts at every scale and by the trust region of ..."""
+
+
 def white(n: int, amplitude: float, seed: int, state: Mapping[str, Any]) -> tuple[NDArray[np.float64], dict[str, Any]]:
     """Uniform white noise: x[i] = (u - 0.5) (2 amplitude), *n samples in [-amplitude, amplitude)."""
 
@@ -1587,6 +1595,10 @@ def Poisson2026(n: int, mean: float, key: int, stream: int, position: float) -> 
 
 def Binomial2026(n: int, trials: float, p: float, key: int, stream: int, position: float) -> NDArray[np.float64]:
     """Binomial noise: numbers of successes in `trials` trials of probability p, trials a whole number ..."""
+
+
+def NonlinearFit2026(x: ArrayLike, y: ArrayLike, w: ArrayLike, model: Callable[..., Any] | None, jacobian: Callable[..., Any] | None, context: Pointer | None, guess: ArrayLike, lower: ArrayLike, upper: ArrayLike, loss: int, scale: float, tolerance: float, iterations: int) -> tuple[int, NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], float, int]:
+    """The parameters p of a model f(x, p) with the least cost = 1/2 sum over i of scale^2 rho(|w[i]| ..."""
 
 
 def Median_head(x: ArrayLike) -> float:
