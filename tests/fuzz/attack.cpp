@@ -17,6 +17,7 @@
 #include <set>
 #include <stdexcept>
 #include <thread>
+#include <utility>
 
 namespace qx::test {
 
@@ -82,11 +83,18 @@ void TellWhereItEnded() {
                          HowToRepeat(at).c_str());
 }
 
+double ProcessSeconds() {
+    return static_cast<double>(std::clock()) / CLOCKS_PER_SEC;
+}
+
+// By the processor, for a machine may have others to serve; what waits for ever uses none.
 void Watch(const std::atomic<bool> &done) {
+    constexpr double most = 60 * slowness;
     while (!done) {
         std::this_thread::sleep_for(std::chrono::milliseconds(200));
         for (const Current &at : currents)
-            if (at.round >= 0 && static_cast<double>(time(nullptr) - at.since) > 60 * slowness) {
+            if (at.round >= 0 && (ProcessSeconds() - at.since > most * options.threads ||
+                                  static_cast<double>(time(nullptr) - at.start) > 20 * most)) {
                 TellWhereItEnded();
                 std::_Exit(3);
             }
@@ -108,6 +116,10 @@ Disturbance SomeDisturbance(Random &random) {
     return some;
 }
 
+namespace {
+thread_local int64_t heapLeft = 0;
+}
+
 Observed Observe(const Disturbance &disturbance, unsigned char rubbish,
                  const std::function<int32_t()> &call) {
     ResetHost(disturbance.refuseAt, disturbance.refusal);
@@ -122,7 +134,7 @@ Observed Observe(const Disturbance &disturbance, unsigned char rubbish,
         seen.result = call();
         seen.lacksMemory = probe.refusals() > 0;
         seen.allocations = probe.allocations();
-        seen.left = probe.liveAllocations();
+        heapLeft += probe.liveAllocations();
         seen.peakBytes = probe.peakBytes();
     } catch (const std::exception &error) {
         seen.fault = error.what();
@@ -216,16 +228,17 @@ void ForSomeRefusals(Random &random, const Observed &calm,
         }
 }
 
-void HeapBalance::release(const std::function<void()> &release) {
+void GiveBack(const std::function<void()> &release) {
     const HeapProbe probe;
     release();
-    left_ += probe.liveAllocations();
+    heapLeft += probe.liveAllocations();
 }
 
 // What threads share may be given back by another one.
-void HeapBalance::end() const {
-    if (left_ != 0 && options.threads == 1)
-        Tell("%" PRId64 " blocks of the heap are left", left_);
+void EndHeapBalance() {
+    const int64_t left = std::exchange(heapLeft, 0);
+    if (left != 0 && options.threads == 1)
+        Tell("%" PRId64 " blocks of the heap are left", left);
 }
 
 TinyWorkspace::TinyWorkspace(uint32_t size) : size_(size) {

@@ -31,8 +31,10 @@ struct Current {
     std::atomic<int64_t> round = -1;
     std::atomic<const char *> name = nullptr;
     std::atomic<const char *> called = nullptr; // in its case, where that is another export
-    std::atomic<int64_t> since = 0;
+    std::atomic<double> since = 0; // seconds of the process's processor time
+    std::atomic<int64_t> start = 0; // of the clock
 };
+double ProcessSeconds();
 constexpr int mostThreads = 64;
 extern Current currents[mostThreads];
 extern thread_local Current *current;
@@ -40,7 +42,7 @@ extern thread_local Current *current;
 extern std::atomic<int> findings;
 __attribute__((format(printf, 1, 2))) void Tell(const char *format, ...);
 void TellWhereItEnded();
-// Ends a process in which a call does not come back.
+// Ends a process in which a case does not come back.
 void Watch(const std::atomic<bool> &done);
 
 struct Outcome {
@@ -65,7 +67,6 @@ struct Observed {
     std::vector<Reshape> reshapes;
     bool lacksMemory = false; // the heap has refused a request
     int32_t allocations = 0;  // of the heap, refused ones included
-    int32_t left = 0;         // blocks of the heap that were taken and not given back
     int64_t peakBytes = 0;    // of the heap
     std::string fault;        // what the host complains of
     double seconds = 0;       // of the processor
@@ -102,17 +103,10 @@ void CheckHonesty(const char *name, const Disturbance &disturbance, const Outcom
 void ForSomeRefusals(Random &random, const Observed &calm,
                      const std::function<void(const Disturbance &)> &make);
 
-// Counts what calls take of the heap and give back. With `end` nothing may be left.
-class HeapBalance {
-public:
-    void add(const Observed &seen) { left_ += seen.left; }
-    // Gives back what a node holds, and counts that.
-    void release(const std::function<void()> &release);
-    void end() const;
-
-private:
-    int64_t left_ = 0;
-};
+// What the calls of a case take of the heap, and what they and the release of their words give back.
+// At the end of a case nothing may be left.
+void GiveBack(const std::function<void()> &release);
+void EndHeapBalance();
 
 // The workspace for one call in one thread.
 class TinyWorkspace {

@@ -74,7 +74,6 @@ Cost CostOf(const Scenario &scenario) {
     Node node;
     PreparedCall call(scenario, node, {});
     const Observed seen = Observe({}, 0x17, [&call] { return call(); });
-    node.heap.add(seen);
     if (!seen.fault.empty())
         Tell("%s", seen.fault.c_str());
     Cost cost = {seen.seconds, seen.peakBytes, 0, call.status(seen.result)};
@@ -111,6 +110,7 @@ Outcome RunCost(Random &random, const Subject &subject) {
         Limit(RLIMIT_CORE, 0);
         const int before = findings;
         const Cost cost = CostOf(scenario);
+        EndHeapBalance();
         const bool isWritten = write(ends[1], &cost, sizeof cost) == sizeof cost;
         _exit(findings > before ? 1 : isWritten ? 0 : 2);
     }

@@ -34,7 +34,7 @@
 //     fuzz [--seed N] [--rounds N] [--calls N] [--seconds N] [--threads N] [--export NAME]
 //          [--round N] [--kind NAME] [--list]
 //
-// It ends at the first of the limits; the usual one is 100 rounds.
+// It ends at the first of the limits, of which the usual one is 100 rounds, or when it is asked to.
 // Each round makes a case for each export. The case of an export in round k of a seed is the same
 // whatever other exports there are: what is found is repeated by --seed, --export and --round.
 
@@ -45,6 +45,8 @@ namespace {
 // An export that has so many cases, two thirds of them far from valid arguments, and no success is a
 // fault of its recipes or its own.
 constexpr int64_t enoughCases = 1000;
+
+std::atomic<bool> isStopped = false;
 
 struct Tally {
     int64_t cases = 0, successes = 0;
@@ -79,7 +81,8 @@ const CaseKind &SomeKind(Random &random) {
 
 void RunCase(const Subject &subject, int64_t round, Tally &tally) {
     current->name = subject.name.c_str();
-    current->since = time(nullptr);
+    current->since = ProcessSeconds();
+    current->start = time(nullptr);
     current->round = round;
     Random random(SeedOf(options.seed, subject.name, round));
     const CaseKind &kind = SomeKind(random);
@@ -89,6 +92,7 @@ void RunCase(const Subject &subject, int64_t round, Tally &tally) {
         outcome = kind.ofThunk(random, subject);
     else
         outcome = kind.ofRecipe(random, *subject.recipes[static_cast<std::size_t>(random.below(recipes))]);
+    EndHeapBalance();
     ++tally.cases;
     tally.successes += outcome.status >= 0;
     current->round = -1;
@@ -103,7 +107,7 @@ void Work(int thread, std::atomic<int64_t> &next, std::vector<Tally> &tallies) {
     while (findings < 50) {
         const int64_t number = next++;
         const int64_t round = options.onlyRound >= 0 ? options.onlyRound : number / exports;
-        if ((options.rounds > 0 && number >= options.rounds * exports) ||
+        if (isStopped || (options.rounds > 0 && number >= options.rounds * exports) ||
             (options.calls > 0 && callsMade >= options.calls) ||
             (options.seconds > 0 && std::chrono::steady_clock::now() > end))
             return;
@@ -114,6 +118,12 @@ void Work(int thread, std::atomic<int64_t> &next, std::vector<Tally> &tallies) {
         if (options.threads > 1 && random.oneIn(4))
             ChangeWorkspace(random);
     }
+}
+
+// The calls so far are told of; a second signal ends the process at once.
+void Stop(int signal) {
+    isStopped = true;
+    std::signal(signal, SIG_DFL);
 }
 
 void Die(int signal) {
@@ -244,7 +254,7 @@ int main(int count, char **words) {
                              " [--threads N] [--export NAME] [--round N] [--kind NAME] [--list]\n");
         return 2;
     }
-    std::signal(SIGTERM, qx::test::Die);
+    std::signal(SIGTERM, qx::test::Stop);
     if (__sanitizer_set_death_callback != nullptr)
         __sanitizer_set_death_callback(qx::test::TellWhereItEnded);
     else

@@ -15,6 +15,7 @@ std::optional<std::pair<Call::Pair, Call::Meeting>> SomePair(Random &random, con
                                                              int32_t n) {
     Call probe(n);
     Observe({}, 0x17, [&] { return recipe.run(probe); });
+    GiveBack([&] { probe.releaseNodes(); });
     const auto pairs = probe.pairsOfOneType();
     if (pairs.empty())
         return std::nullopt;
@@ -129,10 +130,7 @@ Outcome RunOnce(const Recipe &recipe, const RecipeSpoiling &spoiling, unsigned c
         Attacked(spoiling.disturbance, rubbish, [&] { return recipe.run(call); });
     if (observed != nullptr)
         *observed = seen;
-    HeapBalance heap;
-    heap.add(seen);
-    heap.release([&] { call.releaseNodes(); });
-    heap.end();
+    GiveBack([&] { call.releaseNodes(); });
     const ErrorCode status = call.status(seen.result);
     if (IsRefused(spoiling))
         CheckRefusal(status, (recipe.quirks & NoStatus) == 0);
@@ -180,6 +178,7 @@ Outcome RunRecipeMeetings(Random &random, const Recipe &recipe) {
     const Outcome apart = RunOnce(recipe, spoiling, 0x17, Made::AsSpoilt);
     Call probe(spoiling.n);
     Observe({}, 0x17, [&] { return recipe.run(probe); });
+    GiveBack([&] { probe.releaseNodes(); });
     for (const auto &meeting : probe.pairsOfOneType()) {
         spoiling.shared = meeting;
         const Outcome outcome = RunOnce(recipe, spoiling, 0x17, Made::AsSpoilt);

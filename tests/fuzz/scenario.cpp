@@ -190,13 +190,12 @@ std::optional<std::size_t> ElementBytes(void *handle, const Parameter &parameter
 }
 
 Node::~Node() {
-    heap.release([this] {
+    GiveBack([this] {
         for (void *slot : slots)
             RunSweepOf(slot);
         if (instance != nullptr && release != nullptr)
             release(&instance);
     });
-    heap.end();
 }
 
 Blocks::Blocks(const Scenario &scenario, const Manner &manner) : scenario_(scenario) {

@@ -54,7 +54,6 @@ struct Node {
     void *slots[4] = {};
     void *instance = nullptr;
     int32_t (*release)(void **) = nullptr;
-    HeapBalance heap;
     ~Node();
 };
 

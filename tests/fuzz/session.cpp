@@ -41,10 +41,10 @@ uint64_t KindOf(void *word) {
 
 } // namespace
 
-void Session::Words::release() {
-    heap.release([this] {
-        for (void *&slot : slots)
-            RunSweepOf(std::exchange(slot, nullptr));
+Session::Words::~Words() {
+    GiveBack([this] {
+        for (void *slot : slots)
+            RunSweepOf(slot);
         if (instance != nullptr && releaseInstance != nullptr)
             releaseInstance(&instance);
     });
@@ -57,8 +57,6 @@ std::vector<void *> Session::Words::all() const {
 }
 
 Session::~Session() {
-    words_.release();
-    heap_.end();
     for (const Array &array : arrays_)
         detail::FreeBlock(array.handle);
 }
@@ -128,7 +126,6 @@ Outcome Session::call(const Scenario &scenario, const Places &places, Words &wor
     if (words.instance == nullptr)
         words.releaseInstance = thunk.release;
     const Observed seen = Attacked(scenario.disturbance, 0x17, [&] { return thunk.call(values.data()); });
-    words.heap.add(seen);
     const ErrorCode status = hasError ? error : thunk.returnsCode ? seen.result : 0;
     if (status != ErrInternal) // what two outputs that are one get
         CheckStatus(thunk.name, status, scenario.disturbance, true);
@@ -181,7 +178,7 @@ Outcome Session::step(Random &random, const Thunk &thunk) {
         std::vector<Array> copies;
         for (const Array &array : arrays_)
             copies.push_back({array.parameter, copyOf(array)});
-        Words fresh(heap_);
+        Words fresh;
         const Outcome alone = call(scenario, places, fresh, copies);
         for (const Array &copy : copies)
             detail::FreeBlock(copy.handle);

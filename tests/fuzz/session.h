@@ -29,10 +29,8 @@ private:
         std::array<void *, 4> slots = {};
         void *instance = nullptr;
         int32_t (*releaseInstance)(void **) = nullptr;
-        HeapBalance &heap;
-        explicit Words(HeapBalance &sessions) : heap(sessions) {}
-        ~Words() { release(); }
-        void release();
+        Words() = default;
+        ~Words();
         Words(const Words &) = delete;
         Words &operator=(const Words &) = delete;
         std::vector<void *> all() const;
@@ -50,8 +48,7 @@ private:
     static Outcome call(const Scenario &scenario, const Places &places, Words &words,
                         const std::vector<Array> &arrays);
 
-    HeapBalance heap_; // of all words, which share plans
-    Words words_{heap_};
+    Words words_;
     std::vector<Array> arrays_;
 };
 

@@ -14,7 +14,6 @@ Outcome CallAndCheck(const Scenario &scenario, Node &node, const Manner &manner,
     const Thunk &thunk = *scenario.thunk;
     PreparedCall call(scenario, node, manner);
     const Observed seen = Attacked(scenario.disturbance, manner.rubbish, [&call] { return call(); });
-    node.heap.add(seen);
     if (observed != nullptr)
         *observed = seen;
     const ErrorCode status = call.status(seen.result);
