@@ -340,6 +340,28 @@ TEST_P(Conformance, AWordThatHoldsSomethingElseIsRefused) {
     }
 }
 
+// What a call works with does not change with the words of its node.
+TEST_P(Conformance, TheHostMayExchangeWordsWithinAResize) {
+    const int32_t n = GetParam().sizes.back();
+    NodeWords node, other;
+    Call first(n), second(n);
+    first.use(node);
+    const Result usual = run(first);
+    if (first.words().empty())
+        return;
+    second.use(node);
+    ResetHost();
+    other.releaseInstance = node.releaseInstance;
+    Host().atReshape = [&node, &other] {
+        for (auto &[number, slot] : node.slots)
+            std::swap(slot, other.slots[number]);
+        std::swap(node.instance, other.instance);
+    };
+    const ErrorCode status = statusOf(second);
+    EXPECT_EQ(second.outputHash(status), usual.hash);
+    CheckBlocks();
+}
+
 TEST_P(Conformance, ThreadsDoNotDisturbEachOther) {
     const int32_t n = GetParam().sizes.back();
     const uint64_t expected = run(n).hash;
