@@ -6,7 +6,8 @@
 
 namespace {
 
-template <class T> T element(void *column, int64_t i) {
+template <class T>
+T element(void *column, int64_t i) {
     if constexpr (std::is_pointer_v<T>)
         return static_cast<T>(column) + i;
     else

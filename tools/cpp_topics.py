@@ -52,6 +52,14 @@ STREAMS = {
     "zero_phase": (None, {"keepState": (0, 0)}, ("stateForward", "stateBackward")),
 }
 
+# What of an export is another function: arguments with the one value that they have there.
+FIXED = {
+    "special.gamma": {"x": 0, "selector": 1}, "special.gammainc": {"selector": 0},
+    "special.beta": {"x": 0, "selector": 1}, "special.betainc": {"selector": 0},
+    "special.ellipk": {"phi": 0, "selector": 1}, "special.ellipkinc": {"selector": 0},
+    "special.ellipe": {"phi": 0, "selector": 1}, "special.ellipeinc": {"selector": 0},
+}
+
 # Defaults by topic and argument, or by function and argument. An argument that has one stands behind those
 # that have none.
 DEFAULTS = {
@@ -118,6 +126,8 @@ NAMES = {
     "lambda by": "cross_validation", "lambda is": "given_lambda", "the smoothest": "given_residual",
     "(x[i+1] - x[i-1])": "central2", "(x[i-2] - 8": "central4", "(x[i+1] - x[i]) /": "forward",
     "(x[i] - x[i-1]) /": "backward",
+    "the probability P(X <= x)": "cdf", "the survival P(X > x)": "sf", "the logarithm of the probability": "logcdf",
+    "the logarithm of the survival": "logsf", "the density": "pdf",
     "the automatic method takes": "both_or_neither", "by falling amp": "amplitude", "by rising freq": "frequency",
 }
 # Of choices that their header names elsewhere.
@@ -273,14 +283,15 @@ class Function:
         self.ending = camel(key[len(base):]) if key != base else ""
         if self.stream:
             self.stream = self.stream.replace("Stream", f"{self.ending}Stream")
-        self.begins, self.kept = begins, kept
+        self.fixed = FIXED.get(f"{topic.name}.{base}", {})
+        self.begins, self.kept = {**begins, **{name: (value, value) for name, value in self.fixed.items()}}, kept
         for one in export["arguments"]:
             if one["kind"] in ("opaque", "procedure", "buffer", "instance") or one.get("byAddress"):
                 raise LookupError(f"its argument {one['name']} has no form here")
             if one["kind"] == "record" and any("dimensions" in field for field in RECORDS[one["element"]]["fields"]):
                 raise LookupError(f"its record {one['element']} holds arrays")
         self.arguments = [Argument(topic, base, one) for one in export["arguments"] if one["kind"] != "error"]
-        hidden = {*begins, *kept}
+        hidden = {*self.begins, *kept}
         self.inputs = [one for one in self.arguments if one.goes_in and one.name not in hidden]
         self.outputs = [one for one in self.arguments if one.goes_out and one.name not in hidden]
         for one in self.inputs:
@@ -366,7 +377,10 @@ class Function:
         lines = self.export["documentation"].split("\n")
         margin = min((len(line) - len(line.lstrip()) for line in lines[1:] if line.strip()), default=0)
         text = [lines[0], *(line[margin:] for line in lines[1:])]
-        return "".join(f"// {line}".rstrip() + "\n" for line in text) + f"// Calls {self.export['name']}.\n"
+        return "".join(f"// {line}".rstrip() + "\n" for line in text) + (
+            f"// Calls {self.export['name']}" + "".join(
+                f"{' with' if i == 0 else ','} {name} = {value}" for i, (name, value) in enumerate(self.fixed.items()))
+            + ".\n")
 
     def text(self):
         name, result = self.name, self.result_type()
@@ -552,6 +566,7 @@ HEAD = """#ifndef QX_QX_HPP
 #include "qx/calls.hpp"
 #include "qx/peak_finder.hpp"
 #include "qx/qx.h"
+#include "qx/streams.hpp"
 
 #include <cmath>
 

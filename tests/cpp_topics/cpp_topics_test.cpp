@@ -3,6 +3,7 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cmath>
 #include <complex>
 #include <cstring>
@@ -280,6 +281,12 @@ TEST(Defaults, AreThoseOfMost) {
     EXPECT_EQ(qx::poly::multiply(Samples{1, 1}, Samples{1, 1}), (Samples{1, 2, 1}));
     EXPECT_EQ(qx::poly::derivative(Samples{1, 1, 3}), (Samples{1, 6}));
     EXPECT_NEAR(qx::stats::norm_point(0.975), 1.959963984540054, 1e-15);
+    EXPECT_NEAR(qx::stats::norm(1.959963984540054), 0.975, 1e-15);
+    EXPECT_NEAR(qx::stats::norm(20, qx::stats::What::sf), 2.7536241186062337e-89, 1e-102);
+    EXPECT_EQ(qx::special::gamma(5), 24);
+    EXPECT_NEAR(qx::special::gammainc(2, 3), 0.8008517265285442, 1e-15);
+    EXPECT_NEAR(qx::special::beta(2, 3), 1. / 12, 1e-16);
+    EXPECT_NEAR(qx::special::ellipk(0.5), 1.8540746773013719, 1e-15);
     EXPECT_EQ(qx::stats::mode(Samples{1, 1, 2}, 0).size(), 1U);
     EXPECT_GT(qx::measure::tones(x, 2).amplitudes.size(), 0U);
     Samples pulse(100, 0.0);
@@ -301,6 +308,70 @@ TEST(Threads, HavePlansOfTheirOwn) {
     one.join();
     other.join();
     EXPECT_TRUE(right[0] && right[1]);
+}
+
+// The blocks of a stream that starts anew after each failure and reset.
+const std::size_t kBlocks[] = {0, 700, 1, 2, 13, 699, 60, 1525};
+
+TEST(RunningStream, HasTheBitsOfTheWholeAndTheDefinitions) {
+    const Samples x = Signal<double>(3000);
+    qx::stats::RunningStream stream;
+    EXPECT_TRUE(std::isnan(stream.summary().mean));
+    const qx::stats::Summary whole = stream(x);
+    stream.reset();
+    std::size_t from = 0;
+    for (const std::size_t size : kBlocks) {
+        const qx::test::HeapProbe heap;
+        stream(std::span(x).subspan(from, size));
+        EXPECT_EQ(heap.allocations(), 0);
+        from += size;
+    }
+    const qx::stats::Summary found = stream.summary();
+    EXPECT_EQ(found.count, 3000);
+    const auto bits = [](const qx::stats::Summary &one) {
+        return Samples{one.mean, one.std, one.rms, one.least, one.greatest};
+    };
+    EXPECT_EQ(bits(found), bits(whole));
+    EXPECT_NEAR(found.mean, qx::stats::mean(x), 1e-14);
+    EXPECT_NEAR(found.std * found.std, qx::stats::moment(x, 2), 1e-13);
+    EXPECT_NEAR(found.rms, qx::stats::rms(x), 1e-14);
+    EXPECT_EQ(found.greatest, *std::max_element(x.begin(), x.end()));
+}
+
+TEST(TriggerStream, HasTheTriggersOfTheWholeAndNamesWhatIsWrong) {
+    const Samples x = Signal<double>(3000);
+    typedef qx::measure::TriggerStream Stream;
+    for (const auto slope :
+         {Stream::Direction::rising, Stream::Direction::falling, Stream::Direction::either}) {
+        Stream stream(1.5, slope, 0.1, 3);
+        const qx::measure::Triggers whole = stream(x);
+        ASSERT_GT(whole.indices.size(), 100U);
+        for (std::size_t i = 0; i < whole.indices.size(); ++i) {
+            const auto at = static_cast<std::size_t>(whole.indices[i]);
+            EXPECT_LE(std::abs(whole.positions[i] - static_cast<double>(at) + 0.5), 0.5);
+            if (slope == Stream::Direction::rising) {
+                EXPECT_GE(x[at], 1.5);
+            }
+        }
+        stream.reset();
+        qx::measure::Triggers found;
+        std::size_t from = 0;
+        for (const std::size_t size : kBlocks) {
+            const qx::measure::Triggers part = stream(std::span(x).subspan(from, size));
+            found.positions.insert(found.positions.end(), part.positions.begin(),
+                                   part.positions.end());
+            found.indices.insert(found.indices.end(), part.indices.begin(), part.indices.end());
+            from += size;
+        }
+        EXPECT_EQ(found.indices, whole.indices);
+        ASSERT_EQ(found.positions.size(), whole.positions.size());
+        for (std::size_t i = 0; i < found.positions.size(); ++i)
+            EXPECT_NEAR(found.positions[i], whole.positions[i], 1e-12);
+    }
+    Stream wrong(1.5, Stream::Direction::rising, -1);
+    const auto refused = wrong(qx::returned, std::span(x));
+    EXPECT_FALSE(refused);
+    EXPECT_EQ(refused.code(), ErrNegativeSetting);
 }
 
 } // namespace
