@@ -219,6 +219,7 @@ class OtherDebian(InAFolder):
             ls /usr/include/qx/qx.hpp /usr/include/qx/qx.h /usr/lib/*/pkgconfig/qxanalysis.pc
             ls /usr/share/doc/qxanalysis/licences/NOTICE.md /usr/share/doc/qxanalysis/README.md""")
         self.assertRegex(shown, r"^2\.0 \d")
+        self.assertRegex(self.inside(root, "cd / && python3 -m qx verify"), r"^(\d+) of \1 exports give the published bits")
 
 
 @unittest.skipUnless(ALL, "builds from the archive: ./test --all")

@@ -17,6 +17,7 @@ BLOCK = 1 << 18  # samples, of which a transform takes the bands
 MOST_KEPT = 1 << 18  # samples of a band, where it becomes no narrower than NARROWEST lines of a block
 NARROWEST = 512
 WINDOW = "blackman_harris7"
+MOST_PARTS = 16  # in which harmonics are measured
 DECIBELS_OF_BIT = 20 * math.log10(2)
 
 
@@ -154,10 +155,12 @@ def residual_rms(whole, found, rate):
 
 
 def harmonics(whole, rate, fundamental, count, full_scale=None):
-    """measure.harmonics by the means of the powers over parts of SEGMENT samples; phases are those of the first
-    part, and a bin is one of a part. A QxError where a part has no such tone."""
-    parts = [measure.harmonics(part, rate, fundamental, count, full_scale) for part in whole.parts(SEGMENT)
-             if len(part) == SEGMENT]
+    """measure.harmonics by the means of the powers over parts of SEGMENT samples, MOST_PARTS at most, evenly spread;
+    phases are those of the first part, and a bin is one of a part. A QxError where a part has no such tone."""
+    there = whole.count // SEGMENT
+    chosen = np.linspace(0, there - 1, min(there, MOST_PARTS)).round().astype(int)
+    parts = [measure.harmonics(whole.part(int(i) * SEGMENT, SEGMENT), rate, fundamental, count, full_scale)
+             for i in chosen]
     powers = np.array([one.amplitudes**2 for one in parts])
     mean = powers.mean(0)
 

@@ -54,6 +54,8 @@ class Generating(unittest.TestCase):
         times, samples = self.generated("pulse", "--delay", 0.1, "--width", 0.05, "--amplitude", 3)
         self.assertEqual(times[samples == 3].min(), 0.1)
         self.assertEqual(np.count_nonzero(samples), 100)
+        times, samples = self.generated("triangle-pulse", "--delay", 0.1, "--width", 0.05)
+        self.assertEqual((times[samples > 0].min(), times[samples.argmax()]), (0.1005, 0.125))
         times, samples = self.generated("sinc", "--frequency", 25, "--delay", 0.2)
         np.testing.assert_allclose(samples, np.sinc(50 * (times - 0.2)), atol=1e-12)
 

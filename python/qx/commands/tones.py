@@ -37,8 +37,8 @@ def tones(options):
             analysis = long_tones.harmonics(read.whole, rate, options.fundamental or found.frequencies[0],
                                             options.harmonics, options.full_scale)
             drawn = long_tones.spectrum(read.whole, rate)
-            print(f"Tones of all {read.whole.count} samples; spectrum and harmonics are means over parts of "
-                  f"{long_tones.SEGMENT} samples")
+            print(f"Tones of all {read.whole.count} samples; the spectrum is a mean over parts of {long_tones.SEGMENT} "
+                  f"samples, harmonics are means over {long_tones.MOST_PARTS} of them at most")
         else:
             found = topic.tones(read.values, rate, options.count)
             analysis = measure.harmonics(read.values, rate, options.fundamental, options.harmonics,
