@@ -117,7 +117,8 @@ def _over_time(filter_, rate, factor, unit):
     energy = np.cumsum(impulse[::-1]**2)[::-1]
     first = int(np.count_nonzero(energy > 1e-4 * np.sum(impulse[1:]**2))) + 8  # what follows is too small to be seen
     return [figures.Plot(title, f"Time ({unit})", "Response", [figures.Curve("response", values)], step=factor,
-                         x_range=(0.0, factor * min(first, settled - 1)), link="time") for title, values in (("Impulse response", impulse), ("Step response", step))]
+                         x_range=(0.0, factor * min(first, settled - 1)), link="time")
+            for title, values in (("Impulse response", impulse), ("Step response", step))]
 
 
 def in_the_plane(filter_):
@@ -158,7 +159,8 @@ def coefficients(filter_):
                    for i, row in enumerate(rows.tolist()))
     text = f"sos = {filter_.sos.tolist()!r}" if filter_.is_iir else f"h = {filter_.taps.tolist()!r}"
     is_short = len(rows) <= MOST_ROWS
-    return (f'<details{" open" * is_short}><summary>As a table</summary><div class="wide"><table><tr>{head}</tr>{body}</table></div>'
+    return (f'<details{" open" * is_short}><summary>As a table</summary>'
+            f'<div class="wide"><table><tr>{head}</tr>{body}</table></div>'
             f"</details><details><summary>As text</summary><pre>{html.escape(text)}</pre></details>")
 
 

@@ -35,8 +35,8 @@ SIGNALS = {
     "sinc": lambda n, o: signals.sinc(n, 2 * o.frequency / o.rate, o.delay * 2 * o.frequency, o.amplitude),
     "gauss-pulse": lambda n, o: signals.gauss_pulse(_times(n, o), o.frequency, amplitude=o.amplitude),
     "monopulse": lambda n, o: signals.gauss_monopulse(_times(n, o), o.frequency, o.amplitude),
-    "triangle-pulse": lambda n, o: signals.triangle_pulse(_times(n, o) - o.width / 2, o.width,
-                                                             amplitude=o.amplitude),
+    "triangle-pulse": lambda n, o: signals.triangle_pulse(
+        _times(n, o) - o.width / 2, o.width, amplitude=o.amplitude),
 }
 
 

@@ -83,13 +83,12 @@ def body(sections):
 def table(rows):
     if not rows:
         return []
-    def source(row):  # which may be broken behind a mark
-        return re.sub(r"([._,(])", r"\1<wbr>", html.escape(row.source))
-
+    # Names of functions may be broken behind a mark.
+    sources = [re.sub(r"([._,(])", r"\1<wbr>", html.escape(row.source)) for row in rows]
     cells = "".join(f'<tr><td>{html.escape(row.label)}</td><td class="value">{html.escape(row.value)}'
                     + (f' <span class="error">± {html.escape(row.error)}</span>' if row.error else "")
-                    + f'</td><td>{html.escape(row.unit)}</td><td class="source">{source(row)}</td></tr>\n'
-                    for row in rows)
+                    + f'</td><td>{html.escape(row.unit)}</td><td class="source">{source}</td></tr>\n'
+                    for row, source in zip(rows, sources))
     return [f'<div class="wide"><table><thead><tr><th>Quantity</th><th>Value</th><th></th><th>From</th></tr></thead>'
             f"<tbody>{cells}</tbody></table></div>"]
 

@@ -88,8 +88,8 @@ class AveragedSpectrum:
 class Whole:
     """All samples of a file. Of one that is not longer than `kept` samples only the outline is made: whoever
     analyses it has the samples. Missing ones are gaps of the outline and left out of the figures, or filled in by
-    straight lines, as numpy.interp does it, where `fill` says so. `progress` is told of the samples of each block
-    that is read or passed; it does not go with a Whole to another process."""
+    straight lines, as numpy.interp does it, where `fill` says so. `progress` is called with the number of samples of
+    each block that is read or passed; it does not go with a Whole to another process."""
 
     def __init__(self, kept, outline=Envelope, progress=lambda samples: None, fill=False):
         self.progress, self._fill = progress, fill

@@ -14,7 +14,7 @@ import numpy as np
 
 sys.path.insert(0, str(Path(__file__).resolve().parent.parent))
 import qx  # noqa: E402
-from qx import __main__ as command, long_tones, recording, tones, wholes  # noqa: E402
+from qx import __main__ as command, long_tones, tones, wholes  # noqa: E402
 
 RATE = 1000.0
 T = np.arange(4000) / RATE
