@@ -102,6 +102,7 @@ public:
             for (int32_t j = 0; j < n; ++j)
                 c(i, j) = {t(i, j), 0.0};
         for (int32_t i = 1; i < n; ++i) {
+            x_[i] = {1.0, 0.0};
             y_[i] = 0.0;
             if (!(values[i].im < 0.0))
                 continue;
@@ -117,7 +118,7 @@ public:
     }
     void turnBack(const ComplexMatrix &c) const {
         for (int32_t i = 1; i < c.rows(); ++i)
-            if (y_[i] != 0.0)
+            if (x_[i].re != 1.0 || y_[i] != 0.0)
                 rotate(c, i, x_[i], -y_[i]);
     }
 
