@@ -44,7 +44,7 @@ QX_API void QX_Gauss_2011(double x, double a, double b, double c, QX_OUT DBL *va
     the series in x, in x / (x - 1) or with Euler's factor: in double precision, in two doubles, or
     in integers of as many digits as cancel.
 
-    With |a|, |b|, |c| <= 100, x in [-100, 1): on 10^6 points no NaN and no error above @F@. A call
+    With |a|, |b|, |c| <= 100, x in [-100, 1): on 10^6 points no NaN and no error above 4e-14. A call
     takes some microseconds, up to a few milliseconds where hundreds of digits cancel; a sum that would
     take longer is a NaN. NaN where an argument is NaN or infinite, x > 1, or x = 1 and c <= a + b,
     unless a or b ends the series; +infinity as QX_Gauss.
@@ -73,7 +73,7 @@ QX_API void QX_Kummer(double x, double a, double b, QX_OUT DBL *value);
     terms are below 9e-15; else the power series, or that of exp(x) M(b - a, b, -x), in double precision
     where its terms cancel little, in two doubles, or in integers of as many digits as cancel.
 
-    With |a|, |b|, |x| <= 100: on 10^6 points no NaN and no error above @M@; some microseconds, up to
+    With |a|, |b|, |x| <= 100: on 10^6 points no NaN and no error above 2e-14; some microseconds, up to
     a few milliseconds where hundreds of digits cancel.
 
     exp(x) for equal a and b; 1 for a = 0 and x = 0; the limits at x = +infinity and -infinity for
@@ -103,7 +103,7 @@ QX_API void QX_Tricomi(double x, double a, double b, QX_OUT DBL *value);
     is as good as 0, in a form without a difference, and upwards in b, in double precision or, near a
     zero, in two doubles.
 
-    With |a|, |b| <= 100, x in [1e-3, 100]: on 10^6 points no NaN and no error above @U@; some
+    With |a|, |b| <= 100, x in [1e-3, 100]: on 10^6 points no NaN and no error above 8e-13; some
     microseconds, up to a few milliseconds.
 
     At x = 0 the limit, which is finite for b < 1 or where a is 0, -1, -2, ...; NaN where an argument is

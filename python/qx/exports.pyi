@@ -2094,7 +2094,7 @@ def QX_Elliptic1_85(m: float | ArrayLike, phi: float | ArrayLike, selector: int 
 
 
 def QX_Elliptic1_2026(m: float | ArrayLike, phi: float | ArrayLike, selector: int | ArrayLike) -> float | NDArray[Any]:
-    """As QX_Elliptic1_85, with F(phi, 1) = ln((1 + sin phi) / cos phi) to 3 eps: below a quarter of pi ..."""
+    """As QX_Elliptic1_85, with F(phi, 1) = ln((1 + sin phi) / cos phi) within 1 eps: below a quarter ..."""
 
 
 def QX_Elliptic2(m: float | ArrayLike, phi: float | ArrayLike) -> float | NDArray[Any]:
