@@ -596,7 +596,7 @@ def hyp2f1(a: ArrayLike, b: ArrayLike, c: ArrayLike, x: ArrayLike) -> Any:
     --------
     >>> import qx
     >>> qx.special.hyp2f1(1.0, 1.0, 2.0, 0.5)
-    1.3862943610997172
+    1.3862943611198901
     """
     return core.hyp2f1(x, a, b, c)
 
@@ -644,7 +644,7 @@ def hyperu(a: ArrayLike, b: ArrayLike, x: ArrayLike) -> Any:
     --------
     >>> import qx
     >>> qx.special.hyperu(1.0, 1.5, 8.0)
-    0.11832619222696138
+    0.11832619145678035
     """
     return core.hyperu(x, a, b)
 

@@ -305,7 +305,6 @@ EXCLUDED = {
                             "n_recurrence_complex", "n_inf_complex", "test_spherical_yn_at_zero_complex"),
     # Known faults of the exports.
     "digits of the incomplete gamma function for large a near x": ("test_roundtrip",),
-    "few digits for tiny phi at m = 1": ("test_ellipkinc_singular",),
 }
 
 
