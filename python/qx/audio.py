@@ -87,6 +87,13 @@ def written(path, rate, channels, subtype, kind):
 def wrong_length(local, frames):
     """What is wrong with the lengths that a file announces, or an empty text. `frames` is how many could be
     read."""
+    try:
+        return _wrong_length(local, frames)
+    except struct.error:
+        return "the file is cut off: its header ends early"
+
+
+def _wrong_length(local, frames):
     size = os.path.getsize(local)
     with open(local, "rb") as file:
         start = file.read(24)

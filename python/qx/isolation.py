@@ -54,6 +54,10 @@ def limits_for(size):
 class Died(Exception):
     """A worker has ended, or was ended, without an answer."""
 
+    def __init__(self, reason, crashed=False):
+        super().__init__(reason)
+        self.crashed = crashed
+
 
 class Worker:
     """A process that reads one file after another. It ends with this one, in whatever way this one ends."""
@@ -93,7 +97,7 @@ class Worker:
                 else:
                     return kind, value, reusable
         except (EOFError, ConnectionError):
-            raise Died(self._reason(limits)) from None
+            raise self._death(limits) from None
 
     def _answer(self):
         still, before = 0, None
@@ -110,14 +114,15 @@ class Worker:
         with contextlib.suppress(OSError), open(f"/proc/{self.process.pid}/stat") as file:
             return file.read().rpartition(")")[2].split()[11:13]
 
-    def _reason(self, limits):
+    def _death(self, limits):
         code = self.process.wait()
         if code == -signal.SIGXCPU:
-            return f"reading takes more than {limits.seconds} s of processor time; {ALLOWED_SECONDS} allows more"
+            return Died(f"reading takes more than {limits.seconds} s of processor time; {ALLOWED_SECONDS} allows more")
+        if code == -signal.SIGKILL:
+            return Died("its reader was ended, perhaps for want of memory (SIGKILL)")
         if code < 0:
-            name = signal.Signals(-code).name
-            return f"its reader {'was ended, perhaps for want of memory' if code == -9 else 'crashed'} ({name})"
-        return f"its reader ended with {code}"
+            return Died(f"its reader crashed ({signal.Signals(-code).name})", True)
+        return Died(f"its reader ended with {code}", True)
 
 
 _idle: list = []  # workers
@@ -183,8 +188,8 @@ def _isolated(limits, folder, function, arguments, options, told):
         worker, reusable = _take(), False
         try:
             kind, value, reusable = worker.run(limits, folder, function, arguments, options, tell)
-        except Died:
-            if worker.files == 1 or heard:
+        except Died as death:
+            if worker.files == 1 or heard or not death.crashed:
                 raise
             continue  # what an earlier file has left behind may be the reason
         finally:

@@ -20,7 +20,7 @@ PYTHON = Path(__file__).resolve().parent.parent
 sys.path[:0] = [str(PYTHON), str(PYTHON / "tests")]
 import hostile_files  # noqa: E402
 import library_faults as faults  # noqa: E402
-from qx import files, isolation, recording, viewing  # noqa: E402
+from qx import audio, files, isolation, recording, viewing  # noqa: E402
 
 EACH = 8  # of each kind
 
@@ -155,6 +155,9 @@ class Files(unittest.TestCase):
         for date in ("00/00/2024", "00/02/2024", "01/01/9999"):
             days = "".join(f"{date if i == 7 else f'{i + 1:02}/02/2024'},11:59:00,{i}\n" for i in range(12))
             self.refuses("d.csv", f"Date,Time,u\n{days}".encode(), "may be|is no time")
+        path = self.folder / "a.au"
+        path.write_bytes(hostile_files.KINDS["AU"][2]()[:11])
+        self.assertIn("cut off", audio.wrong_length(path, 0))
         path = self.folder / "f.csv"
         path.write_text("# fs = 1e400 Hz\n# sampling interval 1e-400 s\n1\n2\n")
         self.assertIsNone(recording.read(path).rate)
