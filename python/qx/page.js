@@ -247,7 +247,8 @@ function label(canvas, area, taken, text, x, y) {
   const wide = canvas.measureText(text).width + 4, high = 13;
   for (const [left, top] of [[x - wide / 2, y - 18], [x - wide / 2, y + 6], [x - wide - 5, y - high / 2],
     [x + 5, y - high / 2]]) {
-    const at = [Math.max(area.x, Math.min(left, area.x + area.w - wide)), Math.max(area.y, Math.min(top, area.y + area.h - high))];
+    const at = [Math.max(area.x, Math.min(left, area.x + area.w - wide)),
+      Math.max(area.y, Math.min(top, area.y + area.h - high))];
     if (Math.abs(at[1] - top) > high || taken.some(([a, b, w]) => at[0] < a + w && a < at[0] + wide &&
         Math.abs(at[1] - b) < high)) continue;
     taken.push([...at, wide]);

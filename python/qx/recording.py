@@ -153,9 +153,10 @@ def _of_audio(source, column, start, outline, progress):
 
 
 def _if_longer(whole):
-    """All samples, where the values are a part of them."""
+    """All samples, where the values are a part of them. Where more than half of what is kept is missing, there is too
+    little for the long segments of its spectra."""
     whole.finish()
-    return whole if whole.count else None
+    return whole if whole.count > MOST_SAMPLES // 2 else None
 
 
 def _listed(names, most=12):
