@@ -28,7 +28,7 @@ INSTEAD = {
     "spectra": {"welch": None, "welch_sized": None, "welch_complex": None, "welch_complex_sized": None,
                 "welch_power": None, "analytic": None, "instantaneous_phase": None},
     "signals": {"detrend": None}, "calculus": {"velocity": None},
-    "fit": {"Fit_covariance": None, "Fit_confidence": None, "Fit_prediction": None, "curve": None,
+    "fit": {"Fit_covariance": None, "Fit_confidence": None, "Fit_prediction": None, "curve": None, "nonlinear": None,
             "confidence": "ConfBndGenLS_head", "prediction": "PredBndGenLS_head"},
     "measure": {"delay": None, "delay_spectrum": None, "sound_level": None},
     "fft": {"rfft_long": None, "fft_real": None, "fft_real_sized": None},

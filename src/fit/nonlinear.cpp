@@ -170,7 +170,7 @@ private:
             return 0;
         }
         int exponent;
-        std::frexp(std::max<double>(std::fabs(at.p[j]), typical_[j]), &exponent);
+        std::frexp(std::max(std::fabs(at.p[j]), double{typical_[j]}), &exponent);
         const double fine = std::ldexp(1.0, exponent - 14), usual = std::ldexp(1.0, exponent - 18);
         if (isFine && below >= 2.0 * fine && above >= 2.0 * fine)
             return fourthOrder(at, j, fine);
@@ -257,7 +257,7 @@ private:
 
     ErrorCode begin(ConstRealVector start) {
         for (int32_t j = 0; j < k_; ++j) {
-            here_.p[j] = std::min(std::max<double>(start[j], lower(j)), upper(j));
+            here_.p[j] = std::min(std::max(double{start[j]}, lower(j)), upper(j));
             scale_[j] = 0.0;
         }
         model_.setTypical(here_.p);
@@ -286,7 +286,7 @@ private:
             for (int32_t i = 0; i <= j; ++i)
                 squares += r_(i, j) * r_(i, j);
             lengths_[j] = std::sqrt(squares);
-            scale_[j] = std::max<double>(scale_[j], lengths_[j]);
+            scale_[j] = std::max(double{scale_[j]}, double{lengths_[j]});
             if (scale_[j] == 0.0)
                 scale_[j] = 1.0;
             lowest_[j] = lower(j) - here_.p[j];

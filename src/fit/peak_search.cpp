@@ -13,7 +13,7 @@ namespace {
 constexpr double farthest = 4.0; // deviations, beyond which a peak counts as 0
 
 double Clamped(double value, const FitBounds &bounds, int32_t j) {
-    return std::min<double>(std::max<double>(value, bounds.lower[j]), bounds.upper[j]);
+    return std::min(std::max(value, double{bounds.lower[j]}), double{bounds.upper[j]});
 }
 
 } // namespace
@@ -56,8 +56,8 @@ ErrorCode PeakSearch::fillBins() {
     first_ = last_ = samples_.x[0];
     double sum = 0.0;
     for (int32_t i = 0; i < n; ++i) {
-        first_ = std::min<double>(first_, samples_.x[i]);
-        last_ = std::max<double>(last_, samples_.x[i]);
+        first_ = std::min(first_, double{samples_.x[i]});
+        last_ = std::max(last_, double{samples_.x[i]});
         weight_ += samples_.weight(i);
         sum += samples_.weight(i) * samples_.y[i];
     }

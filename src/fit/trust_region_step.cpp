@@ -77,7 +77,7 @@ bool ScaledColumns::rotate(int32_t p, int32_t q) {
 double ScaledColumns::largest() const {
     double largest = 0.0;
     for (int32_t i = 0; i < count_; ++i)
-        largest = std::max<double>(largest, sigma_[i]);
+        largest = std::max(largest, double{sigma_[i]});
     return largest;
 }
 

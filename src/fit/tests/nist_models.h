@@ -262,7 +262,9 @@ struct NistProblem {
         const auto jacobian = [](const void *user, const DBL *p, DBL *out) {
             const NistProblem &self = *static_cast<const NistProblem *>(user);
             const std::size_t count = self.set.certified.size();
-            std::vector<Dual> b(p, p + count);
+            std::vector<Dual> b(count, 0.0);
+            for (std::size_t j = 0; j < count; ++j)
+                b[j] = Dual(p[j]);
             for (std::size_t j = 0; j < count; ++j) {
                 b[j].slope = 1.0;
                 for (std::size_t i = 0; i < self.target.size(); ++i)
