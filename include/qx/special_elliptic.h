@@ -22,8 +22,8 @@ QX_API void QX_Elliptic1(double m, double phi, QX_OUT DBL *value);
     NaN: m in all results; phi in some results. */
 QX_API void QX_Elliptic1_85(double m, double phi, QX_OUT DBL *value, int32_t selector);
 
-/** As QX_Elliptic1_85, with F(phi, 1) = ln((1 + sin phi) / cos phi) within 1 eps: below a quarter of pi as
-    ln(1 + 2 t / (1 - t)), t = tan(phi / 2). Infinite from the double next to pi / 2 on.
+/** As QX_Elliptic1_85, with F(phi, 1) = ln((1 + sin phi) / cos phi) within 1 eps: below a quarter
+    of pi as ln(1 + 2 t / (1 - t)), t = tan(phi / 2). Infinite from the double next to pi / 2 on.
     NaN: m in all results; phi in some results. */
 QX_API void QX_Elliptic1_2026(double m, double phi, QX_OUT DBL *value, int32_t selector);
 
