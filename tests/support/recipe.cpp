@@ -149,10 +149,10 @@ void **Call::slot(int number) {
 }
 
 void **Call::instance(int32_t (*release)(void **)) {
-    if (node_ == &own_)
-        node_->instance = preset_;
-    if (node_->instance == nullptr) // else the word ends as whoever filled it has it
+    if (node_->instance == nullptr) { // else the word ends as whoever filled it has it
+        node_->instance = node_ == &own_ ? preset_ : nullptr;
         node_->releaseInstance = release;
+    }
     return &node_->instance;
 }
 
