@@ -52,7 +52,8 @@ const std::map<std::string, Documented> &DocumentedCodes() {
 std::string HowToRepeat(const Current &at) {
     const std::string kind = options.onlyKind.empty() ? "" : " --kind " + options.onlyKind;
     return "--seed " + std::to_string(options.seed) + " --export " +
-           (at.name != nullptr ? at.name.load() : "") + " --round " + std::to_string(at.round) + kind;
+           (at.name != nullptr ? at.name.load() : "") + " --round " + std::to_string(at.round) +
+           kind;
 }
 
 } // namespace
@@ -83,9 +84,7 @@ void TellWhereItEnded() {
                          HowToRepeat(at).c_str());
 }
 
-double ProcessSeconds() {
-    return static_cast<double>(std::clock()) / CLOCKS_PER_SEC;
-}
+double ProcessSeconds() { return static_cast<double>(std::clock()) / CLOCKS_PER_SEC; }
 
 // By the processor, for a machine may have others to serve; what waits for ever uses none.
 void Watch(const std::atomic<bool> &done) {

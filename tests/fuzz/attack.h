@@ -31,8 +31,8 @@ struct Current {
     std::atomic<int64_t> round = -1;
     std::atomic<const char *> name = nullptr;
     std::atomic<const char *> called = nullptr; // in its case, where that is another export
-    std::atomic<double> since = 0; // seconds of the process's processor time
-    std::atomic<int64_t> start = 0; // of the clock
+    std::atomic<double> since = 0;              // seconds of the process's processor time
+    std::atomic<int64_t> start = 0;             // of the clock
 };
 double ProcessSeconds();
 constexpr int mostThreads = 64;

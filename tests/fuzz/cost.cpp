@@ -36,13 +36,14 @@ std::map<std::string, Cost> highest;
 
 int32_t SomeNumber(Random &random, int32_t usual) {
     constexpr int32_t most = std::numeric_limits<int32_t>::max();
-    constexpr int32_t large[] = {1000,      10000,     65537, 1000000,  4000000, 16777217,
-                                 100000000, 1 << 30,   most,  most - 1, -most,   -1000000};
+    constexpr int32_t large[] = {1000,      10000,   65537, 1000000,  4000000, 16777217,
+                                 100000000, 1 << 30, most,  most - 1, -most,   -1000000};
     return random.oneIn(2) ? random.oneOf(large) : usual;
 }
 
 double SomeScale(Random &random, double usual) {
-    constexpr double scales[] = {1e-300, 1e-30, 1e-12, 1e-9, 1e-6, 1e-3, 1e3, 1e6, 1e9, 1e12, 1e30, 1e300};
+    constexpr double scales[] = {1e-300, 1e-30, 1e-12, 1e-9, 1e-6, 1e-3,
+                                 1e3,    1e6,   1e9,   1e12, 1e30, 1e300};
     return random.oneIn(3) ? random.oneOf(scales) * (random.oneIn(4) ? -1 : 1) : usual;
 }
 
@@ -61,7 +62,8 @@ Scenario SomeCostlyScenario(Random &random, const Thunk &thunk) {
         argument.real = SomeScale(random, argument.real);
         const auto whole = static_cast<int32_t>(argument.whole);
         if (parameter.element == "DBL")
-            std::copy_n(reinterpret_cast<const unsigned char *>(&argument.real), 8, argument.bytes.data());
+            std::copy_n(reinterpret_cast<const unsigned char *>(&argument.real), 8,
+                        argument.bytes.data());
         else if (argument.bytes.size() <= sizeof whole)
             std::copy_n(reinterpret_cast<const unsigned char *>(&whole), argument.bytes.size(),
                         argument.bytes.data());
@@ -80,8 +82,10 @@ Cost CostOf(const Scenario &scenario) {
     for (const Reshape &reshape : seen.reshapes)
         if (const int64_t bytes = int64_t{16} * reshape.count; bytes <= int64_t{grantedBlock})
             cost.hosts += bytes;
-    if (seen.seconds > secondsByItself + secondsPerByte * static_cast<double>(cost.heap + cost.hosts))
-        Tell("took %.1f s of the processor for %" PRId64 " bytes", seen.seconds, cost.heap + cost.hosts);
+    if (seen.seconds >
+        secondsByItself + secondsPerByte * static_cast<double>(cost.heap + cost.hosts))
+        Tell("took %.1f s of the processor for %" PRId64 " bytes", seen.seconds,
+             cost.heap + cost.hosts);
     if (cost.heap > mostHeap)
         Tell("took %" PRId64 " bytes of the heap", cost.heap);
     CheckHost();

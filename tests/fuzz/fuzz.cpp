@@ -91,7 +91,8 @@ void RunCase(const Subject &subject, int64_t round, Tally &tally) {
     if (recipes == 0 || (subject.thunk != nullptr && !random.oneIn(3)))
         outcome = kind.ofThunk(random, subject);
     else
-        outcome = kind.ofRecipe(random, *subject.recipes[static_cast<std::size_t>(random.below(recipes))]);
+        outcome = kind.ofRecipe(random,
+                                *subject.recipes[static_cast<std::size_t>(random.below(recipes))]);
     EndHeapBalance();
     ++tally.cases;
     tally.successes += outcome.status >= 0;
@@ -218,8 +219,8 @@ int Main() {
         if (one.successes == 0 && one.cases >= enoughCases && !mustFail)
             Tell("%s was never successful", name);
     }
-    std::printf("seed %" PRIu64 ": %" PRId64 " calls in %" PRId64 " cases of %zu exports in %d threads, %" PRId64
-                " cases successful, %d findings\n",
+    std::printf("seed %" PRIu64 ": %" PRId64 " calls in %" PRId64
+                " cases of %zu exports in %d threads, %" PRId64 " cases successful, %d findings\n",
                 options.seed, callsMade.load(), all.cases, AllSubjects().size(), options.threads,
                 all.successes, findings.load());
     if (!neverRight.empty())

@@ -126,8 +126,7 @@ Outcome RunOnce(const Recipe &recipe, const RecipeSpoiling &spoiling, unsigned c
     Call call(spoiling.n);
     Spoil(call, spoiling, made);
     const std::string name = recipe.exportName();
-    const Observed seen =
-        Attacked(spoiling.disturbance, rubbish, [&] { return recipe.run(call); });
+    const Observed seen = Attacked(spoiling.disturbance, rubbish, [&] { return recipe.run(call); });
     if (observed != nullptr)
         *observed = seen;
     GiveBack([&] { call.releaseNodes(); });

@@ -115,8 +115,8 @@ bool Scenario::writesOneTwice() const {
 bool Scenario::writesInput() const {
     for (std::size_t i = 0; i < arguments.size(); ++i) {
         const int other = arguments[i].aliasOf;
-        if (other >= 0 && thunk->parameters[i].isOut !=
-                              thunk->parameters[static_cast<std::size_t>(other)].isOut)
+        if (other >= 0 &&
+            thunk->parameters[i].isOut != thunk->parameters[static_cast<std::size_t>(other)].isOut)
             return true;
     }
     return false;

@@ -30,8 +30,10 @@ const Thunk &SomeThunk(Random &random) {
         return found;
     }();
     if (random.oneIn(2))
-        return *withWord[static_cast<std::size_t>(random.below(static_cast<int32_t>(withWord.size())))];
-    return AllThunks()[static_cast<std::size_t>(random.below(static_cast<int32_t>(AllThunks().size())))];
+        return *withWord[static_cast<std::size_t>(
+            random.below(static_cast<int32_t>(withWord.size())))];
+    return AllThunks()[static_cast<std::size_t>(
+        random.below(static_cast<int32_t>(AllThunks().size())))];
 }
 
 // The kind of cell that a word holds; 0 for none.
@@ -61,7 +63,8 @@ Session::~Session() {
         detail::FreeBlock(array.handle);
 }
 
-std::size_t Session::someArray(Random &random, const Parameter &parameter, const Argument &argument) {
+std::size_t Session::someArray(Random &random, const Parameter &parameter,
+                               const Argument &argument) {
     std::vector<std::size_t> candidates;
     for (std::size_t i = 0; i < arrays_.size(); ++i)
         if (arrays_[i].parameter.kind == parameter.kind &&
@@ -77,8 +80,7 @@ std::size_t Session::someArray(Random &random, const Parameter &parameter, const
 // Those that have grown and, of many, some.
 void Session::dropArrays(Random &random) {
     std::erase_if(arrays_, [&](const Array &array) {
-        const std::size_t most =
-            array.parameter.dimensions() == 2 ? mostOfMatrix : mostElements;
+        const std::size_t most = array.parameter.dimensions() == 2 ? mostOfMatrix : mostElements;
         const auto bytes = ElementBytes(array.handle, array.parameter);
         const bool isDropped = !bytes || *bytes > most * ElementSize(array.parameter.element) ||
                                (arrays_.size() > mostArrays && random.oneIn(2));
@@ -91,10 +93,10 @@ void Session::dropArrays(Random &random) {
 void *Session::copyOf(const Array &array) {
     const int dimensions = array.parameter.dimensions();
     int32_t sizes[2] = {0, 0};
-    std::memcpy(sizes, *static_cast<void **>(array.handle), 4 * static_cast<std::size_t>(dimensions));
-    void *const copy =
-        detail::NewBlock(dimensions, TypeCode(array.parameter.element),
-                         ElementSize(array.parameter.element), sizes[0], sizes[1]);
+    std::memcpy(sizes, *static_cast<void **>(array.handle),
+                4 * static_cast<std::size_t>(dimensions));
+    void *const copy = detail::NewBlock(dimensions, TypeCode(array.parameter.element),
+                                        ElementSize(array.parameter.element), sizes[0], sizes[1]);
     std::memcpy(*static_cast<void **>(copy), *static_cast<void **>(array.handle),
                 detail::BlockSize(copy));
     return copy;
@@ -125,7 +127,8 @@ Outcome Session::call(const Scenario &scenario, const Places &places, Words &wor
     }
     if (words.instance == nullptr)
         words.releaseInstance = thunk.release;
-    const Observed seen = Attacked(scenario.disturbance, 0x17, [&] { return thunk.call(values.data()); });
+    const Observed seen =
+        Attacked(scenario.disturbance, 0x17, [&] { return thunk.call(values.data()); });
     const ErrorCode status = hasError ? error : thunk.returnsCode ? seen.result : 0;
     if (status != ErrInternal) // what two outputs that are one get
         CheckStatus(thunk.name, status, scenario.disturbance, true);

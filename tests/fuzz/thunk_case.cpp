@@ -13,7 +13,8 @@ Outcome CallAndCheck(const Scenario &scenario, Node &node, const Manner &manner,
                      Observed *observed = nullptr) {
     const Thunk &thunk = *scenario.thunk;
     PreparedCall call(scenario, node, manner);
-    const Observed seen = Attacked(scenario.disturbance, manner.rubbish, [&call] { return call(); });
+    const Observed seen =
+        Attacked(scenario.disturbance, manner.rubbish, [&call] { return call(); });
     if (observed != nullptr)
         *observed = seen;
     const ErrorCode status = call.status(seen.result);

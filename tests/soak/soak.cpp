@@ -274,17 +274,18 @@ int Main() {
     }
     if (last.heap > first.heap + heapNoise || last.resident > first.resident + residentNoise ||
         last.sweeps != first.sweeps)
-        Tell("memory", "it grows: heap from %" PRId64 " to %" PRId64 ", resident from %" PRId64
-                       " to %" PRId64 " bytes, sweeps from %d to %d",
+        Tell("memory",
+             "it grows: heap from %" PRId64 " to %" PRId64 ", resident from %" PRId64 " to %" PRId64
+             " bytes, sweeps from %d to %d",
              first.heap, last.heap, first.resident, last.resident, first.sweeps, last.sweeps);
     CompareWithAccepted();
-    std::printf("seed %" PRIu64 ": %" PRId64 " calls of %zu exports (%zu kinds of call) in %d threads,"
-                " %" PRIu64 " phases, %" PRId64 " refused where the region is scarce; heap in use"
-                " %" PRId64 " then %" PRId64 " bytes, resident %" PRId64 " then %" PRId64
-                " bytes; %d findings\n",
-                options.seed, calls, HashEveryExport().size(), steps.size(), options.threads,
-                phases, refused, first.heap, last.heap, first.resident, last.resident,
-                findings.load());
+    std::printf(
+        "seed %" PRIu64 ": %" PRId64 " calls of %zu exports (%zu kinds of call) in %d threads,"
+        " %" PRIu64 " phases, %" PRId64 " refused where the region is scarce; heap in use"
+        " %" PRId64 " then %" PRId64 " bytes, resident %" PRId64 " then %" PRId64
+        " bytes; %d findings\n",
+        options.seed, calls, HashEveryExport().size(), steps.size(), options.threads, phases,
+        refused, first.heap, last.heap, first.resident, last.resident, findings.load());
     return findings > 0 ? 1 : 0;
 }
 
