@@ -46,11 +46,12 @@ __attribute__((always_inline)) inline void MultiplyAndAdd(int64_t products) {
         asm volatile("" : : QX_VECTOR_REGISTER(sum));
 }
 #ifdef QX_HAS_AVX2_BUILD
-__attribute__((target("avx2")))
-#endif
-void MultiplyAndAddWide(int64_t products) {
+__attribute__((target("avx2"))) void MultiplyAndAddWide(int64_t products) {
     MultiplyAndAdd<32>(products);
 }
+#else
+void MultiplyAndAddWide(int64_t products) { MultiplyAndAdd<16>(products); }
+#endif
 
 void DirectAgainstTheMachine() {
     Ratios ratios("direct convolution, 64 taps and more");

@@ -42,7 +42,7 @@ int start(void) {
     QXHostFree(x);
     status.status = 0;
     status.code = 1;
-    InitializeAnalysisWorkspaceH(-1, &status); /* a record without gaps */
+    EnableAnalysisWorkspaceH(&status); /* a record without gaps; no region is reserved */
     return status.status == 1 && status.code < 0 ? 42 : 2;
 }
 """
