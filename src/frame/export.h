@@ -33,7 +33,8 @@ namespace qx {
 //     inputs(), a tuple of references to its views, and the others by outputs(), a tuple of what
 //     their identity() gives.
 //   - the body runs in the arithmetic in which results are defined (frame/arithmetic.h), whatever the host
-//     has set; so do calls of the host within it, and an export without a frame has the line for itself.
+//     has set; so do calls of the host within it. An export without a frame, or one that computes an argument of the
+//     body, has the line for itself.
 //   - everything else (numbers, plain pointers, plan keepers) is handed on as it is.
 // A body is a function or a lambda whose parameters have their types written out; it returns an
 // Outcome or an ErrorCode. What a twin does differently is a template argument of its body, or a

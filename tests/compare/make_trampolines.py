@@ -1,10 +1,17 @@
 #!/usr/bin/python3
-"""make_trampolines.py CATALOGUE OUTPUT [--show] [--but NAME...]: writes, for each export of the
+"""make_trampolines.py CATALOGUE OUTPUT [--show] [--modes] [--but NAME...]: writes, for each export of the
 catalogue, a function of its name that jumps to wherever a module has it, so that one program calls
-the exports of any module that it loads. --show: others see the functions, too. --but: not these."""
+the exports of any module that it loads. --show: others see the functions, too. --modes: each sets the modes of
+arithmetic in qxModesOfCalls first, unless that is 0 (x86). --but: not these."""
 
 import argparse
 import json
+
+SETS_MODES = '''        "cmpl $0, qxModesOfCalls(%rip)\\n"
+        "je 1f\\n"
+        "ldmxcsr qxModesOfCalls(%rip)\\n"
+        "1:\\n"
+'''
 
 
 def main():
@@ -12,6 +19,7 @@ def main():
     parser.add_argument("catalogue")
     parser.add_argument("output")
     parser.add_argument("--show", action="store_true")
+    parser.add_argument("--modes", action="store_true")
     parser.add_argument("--but", nargs="*", default=[])
     options = parser.parse_args()
     with open(options.catalogue, encoding="utf-8") as file:
@@ -20,7 +28,9 @@ def main():
         f'        ".globl {name}\\n"\n'
         + ("" if options.show else f'        ".hidden {name}\\n"\n')
         + f'        ".type {name}, @function\\n"\n'
-        f'        "{name}: " JUMP_BY("qxExportTargets+{8 * place}") "\\n"\n'
+        f'        "{name}:\\n"\n'
+        + (SETS_MODES if options.modes else "") +
+        f'        JUMP_BY("qxExportTargets+{8 * place}") "\\n"\n'
         for place, name in enumerate(names) if name not in options.but)
     text = ('#include "tests/compare/trampolines.h"\n\n'
             f'void *qxExportTargets[{len(names)}];\n\n'

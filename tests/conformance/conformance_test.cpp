@@ -6,7 +6,6 @@
 #include "tests/fuzz/oddities.h"
 #include "tests/support/code_list.h"
 #include "tests/support/heap_probe.h"
-#include "tests/support/host_arithmetic.h"
 #include "tests/support/recipe.h"
 
 #include <gtest/gtest.h>
@@ -407,25 +406,6 @@ TEST(Hashes, AreThoseThatWereAccepted) {
     // ./test looks for this line at each width of each preset.
     std::printf("hashes of %d exports compared at %d lanes\n", static_cast<int>(hashes.size()),
                 static_cast<int>(lanesInUse));
-}
-
-// Whatever modes the host has set when it calls, and it has them again afterwards.
-TEST(Hashes, AreTheSameInEveryArithmeticOfTheHost) {
-    const std::map<std::string, uint64_t> expected = HashEveryExport();
-    for (const NamedModes &host : modesOfHosts) {
-        std::string changed;
-        const auto found = HashEveryExport([&](const Recipe &recipe, Call &call) {
-            const InArithmetic hosts(host.modes);
-            const int32_t result = recipe.run(call);
-            if (CurrentArithmetic() != host.modes)
-                changed += "\n" + recipe.name + " leaves other modes";
-            return result;
-        });
-        for (const auto &[name, hash] : expected)
-            if (found.at(name) != hash)
-                changed += "\n" + name + " gives other bits";
-        EXPECT_EQ(changed, "") << host.name;
-    }
 }
 
 TEST(Catalogue, EveryExportHasARecipe) {

@@ -13,8 +13,9 @@ std::vector<Recipe> SpecialIntegralRecipes() {
         {"QX_ExpI",
          [](Call &c) {
              int output = 0;
+             const double arguments[] = {0.9 / c.n, 0.6 * c.n};
              for (const int32_t n : {0, 1, 2, 7, 200, 6000})
-                 for (const double x : {0.9 / c.n, 0.6 * c.n})
+                 for (const double x : arguments)
                      QX_ExpI(x, n, c.scalar(output++));
              return 0;
          },
@@ -22,8 +23,9 @@ std::vector<Recipe> SpecialIntegralRecipes() {
         {"QX_ExpI_2026",
          [](Call &c) {
              int output = 0;
+             const double arguments[] = {0.3 / c.n, 0.9 / c.n, 0.6 * c.n, 5.5 * c.n, 710.0 + c.n};
              for (const int32_t n : {0, 1, 2, 7})
-                 for (const double x : {0.3 / c.n, 0.9 / c.n, 0.6 * c.n, 5.5 * c.n, 710.0 + c.n})
+                 for (const double x : arguments)
                      QX_ExpI_2026(x, n, c.scalar(output++));
              return 0;
          },

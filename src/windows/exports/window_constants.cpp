@@ -30,5 +30,6 @@ ErrorCode WinConstByNameH(int32_t n, int32_t selector, double param, WindowConst
 
 ErrorCode WinConstByNameH_2016(int32_t n, int32_t selector, double param,
                                WindowConstants *constants) {
+    const qx::DefaultArithmetic arithmetic; // for the argument, too
     return Returned(qx::ByName, n, selector, qx::PreparedWindowParam(selector, param), constants);
 }
