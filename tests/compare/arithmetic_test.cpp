@@ -7,6 +7,9 @@
 #include "tests/support/recipe.h"
 
 #include <cstdio>
+#include <iterator>
+#include <map>
+#include <string>
 
 extern "C" {
 __attribute__((visibility("hidden"))) uint32_t qxModesOfCalls = 0;
@@ -14,7 +17,14 @@ __attribute__((visibility("hidden"))) uint32_t qxModesOfCalls = 0;
 
 namespace {
 
-using namespace qx::test;
+using qx::test::Call;
+using qx::test::CurrentArithmetic;
+using qx::test::HashEveryExport;
+using qx::test::InArithmetic;
+using qx::test::modesOfHosts;
+using qx::test::NamedModes;
+using qx::test::Recipe;
+using qx::test::usualArithmetic;
 
 // The exports that give other bits, or leave other modes; each is printed.
 int Different(const NamedModes &host, const std::map<std::string, uint64_t> &expected) {
@@ -37,7 +47,7 @@ int Different(const NamedModes &host, const std::map<std::string, uint64_t> &exp
 } // namespace
 
 int main(int count, char **arguments) {
-    if (count != 2 || BindExports(arguments[1]) == nullptr)
+    if (count != 2 || qx::test::BindExports(arguments[1]) == nullptr)
         return 2;
     const auto expected = HashEveryExport();
     int different = 0;
