@@ -3,6 +3,7 @@ out of an averaged spectrum a band is cut out, and the tones are measured in thi
 
 import dataclasses
 import math
+from typing import Any
 
 import numpy as np
 
@@ -28,9 +29,10 @@ def strongest(whole, rate, count=5):
 
 def measured(whole, rate, count=5):
     """Up to `count` tones, the largest first, as tones.tones has them of samples in memory; the residual is
-    None (`residual_rms` takes a pass). A QxError where there are none."""
+    NaN (`residual_rms` takes a pass). A QxError where there are none."""
     centres = _centres(whole, count)
-    found, refusal = [], None
+    found: list[Any] = []
+    refusal: Any = None
     for centre, band in zip(centres, _bands(whole, centres)):
         try:
             found += _in_band(whole, band, centre, count)
@@ -40,7 +42,8 @@ def measured(whole, rate, count=5):
         raise refusal
     largest = sorted(found, key=lambda one: -one[2])[:count]
     f, f_error, a, a_error, phase, significant = map(np.array, zip(*largest))
-    return tones.Tones(f * rate, f_error * rate, a, a_error, phase, significant.astype(bool), None, rate / whole.count)
+    return tones.Tones(f * rate, f_error * rate, a, a_error, phase, significant.astype(bool), math.nan,
+                       rate / whole.count)
 
 
 def spectrum(whole, rate, window=WINDOW):

@@ -3,6 +3,7 @@ go to a temporary file of which further passes take blocks, so the memory does n
 
 import functools
 import tempfile
+from typing import Any
 
 import numpy as np
 
@@ -22,7 +23,8 @@ class Moments:
 
     def __init__(self):
         self.count, self.sums = 0, np.zeros(3)
-        self._first, self._mean = None, np.float64(0)
+        self._first: Any = None
+        self._mean = np.float64(0)
         self.least, self.greatest = np.inf, -np.inf
 
     def add(self, values):
@@ -97,7 +99,7 @@ class Whole:
         self.envelope, self.moments = outline(), Moments()
         self._waiting = []  # until there are more than are kept
         self._last, self._gap = None, 0  # the last value, and how many are missing behind it
-        self._file = None
+        self._file: Any = None
 
     def add(self, values):
         if not len(values):
