@@ -12,7 +12,8 @@ static long jump(void) {
 
 int clock_gettime(clockid_t clock, struct timespec *now) {
     int status = (int)syscall(SYS_clock_gettime, clock, now);
-    if (clock == CLOCK_REALTIME) now->tv_sec += jump();
+    if (clock == CLOCK_REALTIME)
+        now->tv_sec += jump();
     return status;
 }
 
@@ -25,6 +26,7 @@ int gettimeofday(struct timeval *now, void *zone) {
 time_t time(time_t *now) {
     struct timespec found;
     clock_gettime(CLOCK_REALTIME, &found);
-    if (now) *now = found.tv_sec;
+    if (now)
+        *now = found.tv_sec;
     return found.tv_sec;
 }

@@ -380,8 +380,13 @@ private:
     ErrorCode polish() {
         if (end_ == FitEnd::Exact || !isAtRest_)
             return 0;
-        if (!model_.hasDerivatives() && linearise(true) != 0)
-            return linearise(false);
+        if (!model_.hasDerivatives()) {
+            const ErrorCode failed = linearise(true);
+            if (failed == ErrNonFiniteInput)
+                return linearise(false);
+            if (failed != 0)
+                return failed;
+        }
         double before = kInfinity;
         for (int round = 0; round < mostPolishing; ++round) {
             if (const ErrorCode failed = tryStep(kInfinity))

@@ -74,7 +74,7 @@ def bounded(rng, name, loss):
     if np.any(np.abs(found.x) > 20):  # a valley that goes on to infinity
         return bounded(rng, name, loss)
     return write(("fit", name, loss, n, float(found.cost)), [*start.tolist()], [*lower.tolist()], [*upper.tolist()],
-          [*found.x.tolist()], y.tolist(), w.tolist())
+                 [*found.x.tolist()], y.tolist(), w.tolist())
 
 
 def peak(rng):
