@@ -10,7 +10,7 @@ import qx
 # From 48 kHz to 44.1 kHz without delay
 # -------------------------------------
 
-from qx.resampling import low_pass
+from qx.multirate import low_pass
 L, M = 147, 160
 taps = low_pass(L, M)
 rate = 48000

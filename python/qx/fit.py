@@ -21,7 +21,7 @@ from typing import Any, Literal
 import numpy as np
 from numpy.typing import ArrayLike, NDArray
 
-from .outcomes import QxError
+from .outcomes import QxError, QxWarning, warn
 from .topical import Result, chosen, refuse, result, served, vector, whole_number
 
 __all__ = ["BSpline", "Fit", "SmoothingSpline", "curve", "exponential", "gaussian", "line", "linear",
@@ -659,7 +659,12 @@ def gaussian(x: ArrayLike, y: ArrayLike, sigma: ArrayLike | None = None, offset:
         If x and y differ in length, there are fewer samples than parameters, a sigma is not above 0,
         bounds cross, or a word is none of its words.
     QxError
-        If the fit does not come to an end.
+        If there is no fit.
+
+    Warns
+    -----
+    QxWarning
+        If the fit does not come to an end: there may be no peak in the data.
 
     Examples
     --------
@@ -672,11 +677,23 @@ def gaussian(x: ArrayLike, y: ArrayLike, sigma: ArrayLike | None = None, offset:
     x, y, w = _samples("gaussian", x, y, sigma)
     if not offset and not bounds and method == "least squares":
         start = _limits("gaussian", "ams", None, guess, {})[2]
-        p = core.gaussian_peak(y, x, w, TOLERANCE, start, ITERATIONS, 0.0)[1:4]
+        p = _as_far_as_it_goes("ams", lambda: core.gaussian_peak(y, x, w, TOLERANCE, start, ITERATIONS, 0.0)[1:4])
         return _finished(_gaussian(False), x, y, w, p)
-    return _bounded("gaussian", lambda y, x, w, start, lower, upper, code: core.gaussian(
-        y, x, w, TOLERANCE, ITERATIONS, start, lower, upper, code)[2:6], _gaussian(bool(offset)), x, y, w,
-        bounds, guess, method, {} if offset else {"c": 0.0})
+    return _bounded("gaussian", lambda y, x, w, start, lower, upper, code: _as_far_as_it_goes(
+        "amsc", lambda: core.gaussian(y, x, w, TOLERANCE, ITERATIONS, start, lower, upper, code)[2:6]),
+        _gaussian(bool(offset)), x, y, w, bounds, guess, method, {} if offset else {"c": 0.0})
+
+
+def _as_far_as_it_goes(names: Any, run: Any) -> Any:
+    """The parameters of a fit, with a warning where it has not come to an end."""
+    try:
+        return run()
+    except QxError as error:
+        if error.name != "ErrIterationLimit" or not isinstance(error.results, dict):
+            raise
+        warn(QxWarning("qx.fit.gaussian", error.code, f"qx.fit.gaussian: the fit has not come to an end in {ITERATIONS} "
+                                                      "steps: the data may have no peak"))
+        return [error.results[name] for name in names]
 
 
 def linear(H: ArrayLike, y: ArrayLike, sigma: ArrayLike | None = None,
@@ -811,7 +828,7 @@ def nonlinear(f: Callable[..., Any], x: ArrayLike, y: ArrayLike, guess: Sequence
         The samples.
     guess : sequence
         Start values of p.
-    sigma, absolute_sigma, loss, scale
+    sigma, absolute_sigma, loss, scale : optional
         As of `curve`.
     bounds : dict, optional
         By the name of a parameter its lower and upper bound; equal ones fix it.

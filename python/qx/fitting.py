@@ -2,6 +2,7 @@
 
 import dataclasses
 import math
+import warnings
 from typing import Any
 
 import numpy as np
@@ -9,6 +10,7 @@ import numpy as np
 from . import drawing, figures, isolation, recording
 from . import fit as topic
 from .files import InputError, printable
+from .outcomes import QxWarning
 from .sections import number, uncertain
 
 METHODS = ("least squares", "absolute", "bisquare")
@@ -107,6 +109,7 @@ def fit(model, columns, options=Options(), order=2):
     for name in {**options.guess, **options.lower, **options.upper}:
         if name not in names:
             raise ValueError(f"{formula} has no parameter {name}")
+    unfinished: list[str] = []
     with np.errstate(divide="ignore"):
         sigma = 1 / np.sqrt(np.abs(columns.w)) if len(columns.w) else None
     if model == "polynomial":
@@ -121,8 +124,11 @@ def fit(model, columns, options=Options(), order=2):
         said: dict[str, Any] = {"bounds": bounds, "method": METHODS[options.method]}
         if model != "line":
             said["guess"] = options.guess or None
-        found = getattr(topic, model)(columns.x, columns.y, sigma, **said)
-    return Fitted(found, columns, doubts(model, found, columns))
+        with warnings.catch_warnings(record=True) as caught:
+            warnings.simplefilter("always", QxWarning)
+            found = getattr(topic, model)(columns.x, columns.y, sigma, **said)
+        unfinished = [str(one.message) for one in caught]
+    return Fitted(found, columns, [*unfinished, *doubts(model, found, columns)])
 
 
 def doubts(model, found, columns):

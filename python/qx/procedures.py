@@ -21,7 +21,7 @@ class Procedure:
         self.raised = None
         self._function, self._gives_rows, self._place = function, gives_rows, place
         # Null where there is no function.
-        self.address = ctypes.cast(None, FIT) if function is None else FIT(self._call)
+        self.address = FIT(0) if function is None else FIT(self._call)
 
     def _call(self, _context, x, x_count, p, count, out, n):
         try:

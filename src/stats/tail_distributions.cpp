@@ -21,6 +21,8 @@ constexpr double kNearStudent = 1e-150; // up to there the tail is a half to the
 
 Extended Whole(double x) { return {x, 0.0}; }
 
+constexpr double kLeastStudentDegrees = 1e-25;
+
 double Limited(double degrees) { return std::min(degrees, kMostDegrees); }
 
 bool IsLowerPart(DistributionValue what) {
@@ -119,8 +121,9 @@ Tails SquareTails(double t, double dof) {
     return BetaTails(0.5, 0.5 * dof, point);
 }
 
-// P(T > t), t > 0, at most a half.
+// P(T > t), t > 0, at most a half. With fewer degrees than the least it is a half for all t, to the last bit.
 Scaled UpperStudent(double t, double dof) {
+    dof = std::max(dof, kLeastStudentDegrees);
     if (t < kNearStudent)
         return {0.5, Whole(0.0)};
     const StudentTail quick = StudentTailAt(t, dof);
@@ -269,7 +272,7 @@ double StudentPoint(double p, bool isUpper, double dof) {
     double end;
     if (IsAtEnd(p, isUpper, -kInfinity, &end))
         return end;
-    dof = Limited(dof);
+    dof = std::max(Limited(dof), kLeastStudentDegrees);
     TakeSmaller(p, isUpper);
     if (p == 0.5)
         return 0.0;
