@@ -383,6 +383,8 @@ class Selectors(unittest.TestCase):
         if argument["kind"].startswith("array"):
             n = int(argument["kind"][5])
             return np.arange(1.0, 100.0) if n == 1 else np.eye(4) if n == 2 else np.ones((8, 8, 8))
+        if argument["kind"] == "opaque":
+            return None
         if argument["kind"] == "procedure":
             return lambda x, p: p[0] * x
         return {} if argument["kind"] == "record" else 1

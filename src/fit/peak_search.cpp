@@ -63,14 +63,18 @@ ErrorCode PeakSearch::fillBins() {
     }
     mean_ = sum / weight_;
     const double range = last_ - first_;
-    finest_.width = range > 0.0 ? range / (bins - 1) : 1.0;
+    finest_.width =
+        range < kInfinity ? range / (bins - 1) : last_ / (bins - 1) - first_ / (bins - 1);
+    if (!(finest_.width > 0.0)) // all in one place, or as near as numbers can be
+        finest_.width = range > 0.0 ? range : 1.0;
     Fill(finest_.weights.data(), bins, 0.0);
     Fill(finest_.products.data(), bins, 0.0);
     for (int32_t i = 0; i < n; ++i) {
-        const auto bin = static_cast<int32_t>((samples_.x[i] - first_) / finest_.width + 0.5);
+        const double place = (samples_.x[i] - first_) / finest_.width + 0.5;
+        const int32_t bin = place < bins - 1 ? static_cast<int32_t>(place) : bins - 1;
         const double w = samples_.weight(i), y = samples_.y[i] - mean_;
-        finest_.weights[std::min(bin, bins - 1)] += w;
-        finest_.products[std::min(bin, bins - 1)] += w * y;
+        finest_.weights[bin] += w;
+        finest_.products[bin] += w * y;
         squares_ += w * y * y;
     }
     return 0;

@@ -441,6 +441,22 @@ TEST(ModelFits, TheRevisionFindsPeaksOfAnyWidth) {
     EXPECT_GT(missed, 30) << "the elder finds them, too";
 }
 
+TEST(ModelFits, TheRevisionTakesAbscissaeOverTheWholeRange) {
+    for (const double step : {1.7e308 / 4, 0x1p-1074}) {
+        Samples x, y;
+        for (int i = -4; i <= 4; ++i) {
+            x.push_back(i * step);
+            y.push_back(std::exp(-0.5 * i * i));
+        }
+        double p[3], mse;
+        int32_t iterations = 0;
+        const ErrorCode code = GaussianPeakFit2026_head(
+            DBLArray(y).handle(), DBLArray(x).handle(), DBLArray(Samples{}).handle(), 0.0,
+            DBLArray(Samples{}).handle(), &p[0], &p[1], &p[2], &mse, &iterations, 0.0);
+        EXPECT_TRUE(code < 0 || std::isfinite(mse)) << step << ": " << code;
+    }
+}
+
 TEST(ModelFits, EstimatesOfPeaks) {
     const auto estimate = [](const Samples &x, const Samples &y) {
         return FitPeak(x, y, {.iterations = -1});
