@@ -98,7 +98,10 @@ double EndOfIntegral(const Exponent &exponent, double direction) {
 template <class Exponent>
 double IntegralOf(const Exponent &exponent, double direction) {
     constexpr double longest = 5.5;
+    constexpr double farthest = 1e5; // no integral reaches so far but by a fault
     const double end = EndOfIntegral(exponent, direction);
+    if (!(end < farthest))
+        return kNaN;
     const double panels = std::ceil(end / longest);
     const double width = end / panels;
     Extended sum = Whole(0.0);

@@ -21,9 +21,10 @@ constexpr double kNearStudent = 1e-150; // up to there the tail is a half to the
 
 Extended Whole(double x) { return {x, 0.0}; }
 
+constexpr double kLeastDegrees = 1e-300;
 constexpr double kLeastStudentDegrees = 1e-25;
 
-double Limited(double degrees) { return std::min(degrees, kMostDegrees); }
+double Limited(double degrees) { return std::clamp(degrees, kLeastDegrees, kMostDegrees); }
 
 bool IsLowerPart(DistributionValue what) {
     return what == DistributionValue::Probability || what == DistributionValue::LogProbability;
@@ -103,7 +104,9 @@ double UpperNormalPoint(double p) {
     return x;
 }
 
-Tails ChiSquareTails(double x, double dof) { return GammaTails(0.5 * dof, 0.5 * x); }
+Tails ChiSquareTails(double x, double dof) {
+    return GammaTails(0.5 * dof, std::max(0.5 * x, std::numeric_limits<double>::denorm_min()));
+}
 
 // n f and d as parts of a whole: both are scaled where f is far from 1.
 UnitPoint FisherShare(double f, double n, double d) {

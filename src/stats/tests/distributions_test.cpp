@@ -277,6 +277,8 @@ TEST(DistributionTails, ReachLimitsOfTheDegrees) {
         EXPECT_EQ(Revised("it", {0.43, degrees}, 1), inf);
         EXPECT_EQ(Revised("it", {0.43, degrees}, 0), -inf);
     }
+    EXPECT_EQ(Revised("chi2", {5e-324, 5e-324}, 0), 1);
+    EXPECT_EQ(Revised("ichi2", {0.5, 5e-324}, 0), 0);
     // The quarter of a large number of degrees at the mean of the distribution.
     EXPECT_NEAR(Revised("chi2", {1e10, 1e10}, 0),
                 0.5 + 1 / (3 * std::sqrt(std::numbers::pi * 1e10)), 1e-14);
