@@ -22,6 +22,7 @@ constexpr double kNearStudent = 1e-150; // up to there the tail is a half to the
 Extended Whole(double x) { return {x, 0.0}; }
 
 constexpr double kLeastDegrees = 1e-300;
+constexpr double kLeastHalf = 5e-321; // of chi-square: a quotient by it is not 0
 constexpr double kLeastStudentDegrees = 1e-25;
 
 double Limited(double degrees) { return std::clamp(degrees, kLeastDegrees, kMostDegrees); }
@@ -105,7 +106,7 @@ double UpperNormalPoint(double p) {
 }
 
 Tails ChiSquareTails(double x, double dof) {
-    return GammaTails(0.5 * dof, std::max(0.5 * x, std::numeric_limits<double>::denorm_min()));
+    return GammaTails(0.5 * dof, std::max(0.5 * x, kLeastHalf));
 }
 
 // n f and d as parts of a whole: both are scaled where f is far from 1.
