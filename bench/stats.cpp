@@ -214,9 +214,9 @@ void Anova() {
         qx::FactorialTable table;
         const auto [ours, peer] = LeastTimes(
             [&] {
-                qx::FactorialDesign design = {y.next(turn), n, n / cells, 3, {}};
+                qx::FactorialDesign design = {{y.next(turn), n}, n / cells, 3, {}};
                 for (int i = 0; i < 3; ++i)
-                    design.factor[i] = {labels[i].data(), levels[i], false};
+                    design.factor[i] = {{labels[i].data(), n}, levels[i], false};
                 qx::FactorialAnova(design, nullptr, &table);
                 Keep(table.source[0].f);
             },
