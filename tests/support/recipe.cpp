@@ -130,7 +130,8 @@ void *Call::makeRecords(int number, int32_t count, const void *records, std::siz
 
 double *Call::scalar(int number) {
     const HeapProbe::Pause pause;
-    SetArithmetic(usualArithmetic); // for what a recipe computes between two calls
+    if (CurrentArithmetic() != usualArithmetic)
+        SetArithmetic(usualArithmetic); // for what a recipe computes between two calls
     return &(scalars_[number] = 12345.0);
 }
 
