@@ -57,15 +57,22 @@ __attribute__((noinline)) inline void SetArithmetic(ArithmeticModes modes) {
 // From its construction to its end.
 class InArithmetic {
 public:
-    explicit InArithmetic(ArithmeticModes modes) : before_(CurrentArithmetic()) {
-        SetArithmetic(modes);
+    // Where the modes are these already nothing is written, and the x87 unit keeps its precision.
+    explicit InArithmetic(ArithmeticModes modes)
+        : before_(CurrentArithmetic()), isAnother_(before_ != modes) {
+        if (isAnother_)
+            SetArithmetic(modes);
     }
-    ~InArithmetic() { SetArithmetic(before_); }
+    ~InArithmetic() {
+        if (isAnother_)
+            SetArithmetic(before_);
+    }
     InArithmetic(const InArithmetic &) = delete;
     InArithmetic &operator=(const InArithmetic &) = delete;
 
 private:
     const ArithmeticModes before_;
+    const bool isAnother_;
 };
 
 } // namespace qx::test
