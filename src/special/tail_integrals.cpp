@@ -84,7 +84,7 @@ double EndOfIntegral(const Exponent &exponent, double direction) {
     const double s = std::fabs(exponent.slope());
     double v = -2 * least / (s + std::sqrt(s * s - 2 * least * exponent.curvature()));
     double low = 0.0, high = kInfinity;
-    for (int turn = 0; turn < 200; ++turn) {
+    for (int turn = 0; turn < 2200; ++turn) { // enough to halve through the range of the doubles
         const double at = exponent(direction * v);
         if (at <= least && at >= most)
             break;
@@ -98,7 +98,10 @@ double EndOfIntegral(const Exponent &exponent, double direction) {
 template <class Exponent>
 double IntegralOf(const Exponent &exponent, double direction) {
     constexpr double longest = 5.5;
+    constexpr double farthest = 1e5; // no integral reaches so far but by a fault
     const double end = EndOfIntegral(exponent, direction);
+    if (!(end < farthest))
+        return kNaN;
     const double panels = std::ceil(end / longest);
     const double width = end / panels;
     Extended sum = Whole(0.0);

@@ -19,7 +19,11 @@ constexpr double kNearStudent = 1e-150; // up to there the tail is a half to the
 
 Extended Whole(double x) { return {x, 0.0}; }
 
-double Limited(double degrees) { return std::min(degrees, kMostDegrees); }
+constexpr double kLeastDegrees = 1e-300;
+constexpr double kLeastHalf = 5e-321; // of chi-square: a quotient by it is not 0
+constexpr double kLeastStudentDegrees = 1e-25;
+
+double Limited(double degrees) { return std::clamp(degrees, kLeastDegrees, kMostDegrees); }
 
 bool IsLowerPart(DistributionValue what) {
     return what == DistributionValue::Probability || what == DistributionValue::LogProbability;
@@ -99,7 +103,9 @@ double UpperNormalPoint(double p) {
     return x;
 }
 
-Tails ChiSquareTails(double x, double dof) { return GammaTails(0.5 * dof, 0.5 * x); }
+Tails ChiSquareTails(double x, double dof) {
+    return GammaTails(0.5 * dof, std::max(0.5 * x, kLeastHalf));
+}
 
 // n f and d as parts of a whole: both are scaled where f is far from 1.
 UnitPoint FisherShare(double f, double n, double d) {
@@ -117,8 +123,10 @@ Tails SquareTails(double t, double dof) {
     return BetaTails(0.5, 0.5 * dof, point);
 }
 
-// P(T > t), t > 0, at most a half.
+// P(T > t), t > 0, at most a half. With fewer degrees than the least it is a half for
+// all t, to the last bit.
 Scaled UpperStudent(double t, double dof) {
+    dof = std::max(dof, kLeastStudentDegrees);
     if (t < kNearStudent)
         return {0.5, Whole(0.0)};
     if (t <= kFarStudent) {
@@ -264,7 +272,7 @@ double StudentPoint(double p, bool isUpper, double dof) {
     double end;
     if (IsAtEnd(p, isUpper, -kInfinity, &end))
         return end;
-    dof = Limited(dof);
+    dof = std::max(Limited(dof), kLeastStudentDegrees);
     TakeSmaller(p, isUpper);
     if (p == 0.5)
         return 0.0;

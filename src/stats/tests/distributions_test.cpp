@@ -252,6 +252,14 @@ TEST(DistributionTails, ReachLimitsOfTheDegrees) {
     EXPECT_NEAR(Revised("it", {1e-200, 1.0}, 1), 1e200 / std::numbers::pi, 4e200 * eps);
     EXPECT_EQ(Revised("it", {1e-300, 0.5}, 1), inf);
     EXPECT_EQ(Revised("ichi2", {1e-300, 0.01}, 0), 0);
+    // Hardly any degrees: all but nothing lies beyond the range.
+    for (const double degrees : {1e-20, 1e-50, 1.5272285085778469e-158}) {
+        EXPECT_EQ(Revised("t", {1e300, degrees}, 1), 0.5);
+        EXPECT_EQ(Revised("it", {0.43, degrees}, 1), inf);
+        EXPECT_EQ(Revised("it", {0.43, degrees}, 0), -inf);
+    }
+    EXPECT_EQ(Revised("chi2", {5e-324, 5e-324}, 0), 1);
+    EXPECT_EQ(Revised("ichi2", {0.5, 5e-324}, 0), 0);
     // The quarter of a large number of degrees at the mean of the distribution.
     EXPECT_NEAR(Revised("chi2", {1e10, 1e10}, 0),
                 0.5 + 1 / (3 * std::sqrt(std::numbers::pi * 1e10)), 1e-14);
