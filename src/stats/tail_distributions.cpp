@@ -125,7 +125,8 @@ Tails SquareTails(double t, double dof) {
     return BetaTails(0.5, 0.5 * dof, point);
 }
 
-// P(T > t), t > 0, at most a half. With fewer degrees than the least it is a half for all t, to the last bit.
+// P(T > t), t > 0, at most a half. With fewer degrees than the least it is a half for
+// all t, to the last bit.
 Scaled UpperStudent(double t, double dof) {
     dof = std::max(dof, kLeastStudentDegrees);
     if (t < kNearStudent)

@@ -112,7 +112,7 @@ private:
         const double d10 = std::pow(normOfProduct({a4_, a6_}), 0.1);
         const double fifth = std::min(third, std::max(d8, d10));
         int32_t squarings = 0;
-        if (fifth > 0.0)
+        if (fifth > 0.0 && std::isfinite(fifth))
             squarings = std::max(0, int32_t(std::ceil(std::log2(fifth / degree_->theta))) + power_);
         squarings += moreSquarings(squarings - power_);
         scalePowers(power_ - squarings);
