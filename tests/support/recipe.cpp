@@ -110,13 +110,14 @@ Call::Array &Call::add(Role role, const Place &place, std::unique_ptr<Array> arr
     return *held;
 }
 
-void *Call::makeRecords(int number, int32_t count, const void *records, std::size_t bytes) {
+void *Call::makeRecords(int number, int32_t count, const void *records, std::size_t bytes,
+                        std::size_t least) {
     const HeapProbe::Pause pause;
     // The block is as long as the bytes of its records; its size field counts the records.
     const int32_t stored = sizeOf(number, 0, count);
     const std::size_t each = bytes / static_cast<std::size_t>(count);
     auto array = std::make_unique<Array1<ElementType::U8>>(
-        static_cast<int32_t>(each * static_cast<std::size_t>(stored)));
+        static_cast<int32_t>(std::max(each * static_cast<std::size_t>(stored), least)));
     for (int32_t i = 0; i < stored; ++i)
         std::memcpy(array->array.data() + each * static_cast<std::size_t>(i),
                     static_cast<const char *>(records) + each * static_cast<std::size_t>(i % count),

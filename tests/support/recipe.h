@@ -112,11 +112,12 @@ public:
     Handle2D<Code> in2D(int number, int32_t rows, int32_t cols, const Values &values = {}) {
         return make<Code>(Role::Input, number, rows, cols, values);
     }
-    // A 1-D block of records, `bytes` in all.
+    // A 1-D block of records, `bytes` in all; without records it still has the `least` bytes.
     // Named by the handle type: c.inRecords<HistInterval1D>(1, 3, intervals, sizeof intervals).
     template <class Handle>
-    Handle inRecords(int number, int32_t count, const void *records, std::size_t bytes) {
-        return static_cast<Handle>(makeRecords(number, count, records, bytes));
+    Handle inRecords(int number, int32_t count, const void *records, std::size_t bytes,
+                     std::size_t least = 0) {
+        return static_cast<Handle>(makeRecords(number, count, records, bytes, least));
     }
 
     // Output arrays. They hold rubbish of a few elements before the call.
@@ -303,7 +304,8 @@ private:
     Handle1D<Code> make(Role role, int number, int32_t count, const Values &values);
     template <ElementType Code, class Values>
     Handle2D<Code> make(Role role, int number, int32_t rows, int32_t cols, const Values &values);
-    void *makeRecords(int number, int32_t count, const void *records, std::size_t bytes);
+    void *makeRecords(int number, int32_t count, const void *records, std::size_t bytes,
+                      std::size_t least);
     int32_t sizeOf(int number, int dimension, int32_t asked) const;
     static Meeting meetingOf(const Array &first, const Array &second);
     Array &add(Role role, const Place &place, std::unique_ptr<Array> array);
