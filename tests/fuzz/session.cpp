@@ -172,7 +172,11 @@ Outcome Session::step(Random &random, const Thunk &thunk) {
                       words_.slots[static_cast<std::size_t>(b)]);
         };
 
+    // Their kinds are read now: a call that gets no memory frees the cell of its word.
     const std::vector<void *> before = words_.all();
+    std::vector<uint64_t> kinds;
+    for (void *const word : before)
+        kinds.push_back(KindOf(word));
     Outcome outcome;
     if (!scenario.disturbance.isNone()) {
         const TinyWorkspace workspace(scenario.disturbance.workspace);
@@ -194,7 +198,7 @@ Outcome Session::step(Random &random, const Thunk &thunk) {
             if (kind != Kind::Slot && kind != Kind::Instance)
                 continue;
             const std::size_t word = kind == Kind::Slot ? places[i] : before.size() - 1;
-            if (before[word] == nullptr || KindOf(wanted[word]) == KindOf(before[word]))
+            if (before[word] == nullptr || KindOf(wanted[word]) == kinds[word])
                 continue;
             isOfAnotherKind = true;
             if (outcome.status == ErrInternal && after[word] != before[word])
