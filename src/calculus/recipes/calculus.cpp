@@ -27,8 +27,7 @@ DBL3D Volume(Call &c, int number, int32_t d0) {
         const double element = noise.symmetric();
         std::memcpy(next, &element, sizeof element);
     }
-    return c.inRecords<DBL3D>(number, d0, parts.data(), parts.size() * sizeof(Part),
-                              sizeof others);
+    return c.inRecords<DBL3D>(number, d0, parts.data(), parts.size() * sizeof(Part), sizeof others);
 }
 
 const std::vector<int32_t> sizes = {5, 6, 7, 8, 9, 100};
