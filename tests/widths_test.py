@@ -16,7 +16,7 @@ OBJECTS = {}
 # The namespaces, as names are mangled.
 NAMES = {"avx2": ("4avx2", "6lanes4"), "avx512": ("6avx512", "6lanes8")}
 ALIGNED = re.compile(r"^vmov(?:ap[sd]|dqa|ntp[sd]|ntdqa?)\s+(?=.*\().*%ymm")
-ADDRESS = re.compile(r" *[0-9a-f]+:\t")
+INSTRUCTION = re.compile(r" *[0-9a-f]+:\s+(.*)")
 PLACED_BY_LINKER = set("TWi")  # functions that are global, weak or chosen at run time
 FUSED = re.compile(r"^v?f?n?m(add|sub|addsub|subadd)[1-3]*[ps][sdh]$|^vf(n?m(add|sub)|maddsub|msubadd)|^vfc?maddc")
 # Of a line of a disassembly: what only a wider processor has.
@@ -37,7 +37,7 @@ def instructions(path):
     """Each instruction of an object or a library, from its mnemonic on."""
     listing = subprocess.run([OBJDUMP, "-d", "--no-show-raw-insn", path], check=True, capture_output=True,
                              text=True).stdout
-    return [line.split(":\t", 1)[1] for line in listing.splitlines() if ADDRESS.match(line)]
+    return [match[1] for match in map(INSTRUCTION.match, listing.splitlines()) if match]
 
 
 def found(pattern, lines):
