@@ -26,13 +26,8 @@ Current currents[mostThreads];
 thread_local Current *current = currents;
 std::atomic<int> findings = 0;
 std::atomic<int64_t> callsMade = 0;
-// Small, so that time is bounded by the data and only a loop over a parameter can take long. Under the
-// thread sanitizer a transform of each of as many sections would still take minutes.
-#ifdef __SANITIZE_THREAD__
-std::size_t largestBlock = 128U << 10;
-#else
+// Small, so that time is bounded by the data and only a loop over a parameter can take long.
 std::size_t largestBlock = 4U << 20;
-#endif
 
 namespace {
 
