@@ -174,6 +174,8 @@ def rfft(x: ArrayLike, n: int | None = None, axis: int = LAST,
     array([2.+0.j, 1.-3.j, 0.+0.j])
     """
     if n is None and norm == "backward":
+        if type(x) is np.ndarray and x.ndim == 1 and axis is LAST and len(x) < LONG:
+            return core.rfft(x)[:len(x) // 2 + 1]
         return along(_half, x, axis)
     size = _length("fft.rfft", n, x, axis)
     return _scaled(along(lambda channel: core.rfft_sized(channel, 0, size, 0)[:size // 2 + 1], x, axis),

@@ -128,6 +128,8 @@ class Filter:
         ValueError
             If x is empty.
         """
+        if type(x) is np.ndarray and x.ndim == 1 and axis is LAST:
+            return self._run_complex(x) if x.dtype.kind == "c" else self._run(x)
         return either(self._run, self._run_complex, x, axis)
 
     def _run(self, x: Any) -> Any:

@@ -339,7 +339,13 @@ def buffer(value, element, count, place):
 
 def many(*values):
     """Whether one of the values is no single number."""
-    return any(np.ndim(value) for value in values)
+    for value in values:
+        if type(value) is np.ndarray:
+            if value.ndim:
+                return True
+        elif type(value) is not float and type(value) is not int and np.ndim(value):
+            return True
+    return False
 
 
 SEVERAL = 1 << 15  # elements from which on a function is mapped by several threads
@@ -381,10 +387,82 @@ def _spread(values, columns):
                    np.full(shape, value, dtype) for value, dtype, is_single in checked]
 
 
+FEW = 512  # elements up to which the memory of a call is kept for the next one
+KEPT_CALLS, KEPT_EACH = 64, 4
+
+
+class _Few:
+    """The columns of calls of few elements: memory for arguments and results, and where it is."""
+
+    def __init__(self, name, function, shape):
+        form, columns = _of_columns(name)
+        memory, found = [np.zeros(shape, dtype) for _, dtype, *_ in columns], np.zeros(shape, np.int32)
+        self.given = [(array, array.dtype, element) for array, (is_input, _, element, *_) in zip(memory, columns)
+                      if is_input]
+        self.results = [array for array, column in zip(memory, columns) if not (column[0] or column[3])]
+        self.codes = [found, *(array for array, column in zip(memory, columns) if not column[0] and column[3])]
+        self.none = bytes(found.nbytes)
+        self.call = functools.partial(
+            library().host.QXHostCalls, function, form, found.size,
+            (ctypes.c_void_p * len(memory))(*(array.ctypes.data for array in memory)), found.ctypes.data)
+
+    def results_for(self, values):
+        """Copies of the results; None where an argument is not an array of this shape or a plain number of the
+        type of its column, or where an element has a code."""
+        for (array, dtype, element), value in zip(self.given, values):
+            if type(value) is np.ndarray:
+                if value.dtype is not dtype or value.shape != array.shape:
+                    return None
+                array[...] = value
+            elif type(value) is float and element == "DBL" or type(value) is int and element == "I32" and (
+                    -2**31 <= value < 2**31):
+                array.fill(value)
+            else:
+                return None
+        if self.call():
+            return None
+        for codes in self.codes:
+            if codes.tobytes() != self.none:
+                codes.fill(0)
+                return None
+        return self.results[0].copy() if len(self.results) == 1 else tuple([array.copy() for array in self.results])
+
+
+_few = {}  # (export, shape) -> those of earlier calls
+
+
+def _of_few(name, function, values):
+    """The results for few elements, or None where there is more to do than to call."""
+    for value in values:
+        if type(value) is np.ndarray:
+            break
+    else:
+        return None
+    key = name, value.shape
+    try:
+        few = _few[key].pop()
+    except (KeyError, IndexError):
+        if not value.ndim or not 0 < value.size <= FEW:
+            return None
+        few = _Few(name, function, value.shape)
+    results = few.results_for(values)
+    kept = _few.get(key)
+    if kept is None:
+        if len(_few) >= KEPT_CALLS:
+            _few.clear()
+        kept = _few.setdefault(key, [])
+    if len(kept) < KEPT_EACH:
+        kept.append(few)
+    return results
+
+
 def mapped(entry, function, values):
     """A function of scalars over arrays, element by element, with NumPy's broadcasting. The
     function writes straight into the elements of the result, called by the stand-in host, in several threads
     where there are many."""
+    few = _of_few(entry["name"], function, values)
+    if few is not None:
+        return few
     form, columns = _of_columns(entry["name"])
     shape, given = _spread(values, columns)
     n, codes, results, all_, given = math.prod(shape), None, [], [], iter(given)

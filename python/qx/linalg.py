@@ -192,8 +192,10 @@ class Hessenberg(Result):
 
 def _served(name: Any, *matrices: Any) -> Any:
     """The export for real or for complex matrices."""
-    is_complex = any(matrix.dtype.kind == "c" for matrix in matrices)
-    return getattr(core, name + "_complex" if is_complex else name)
+    for matrix in matrices:
+        if matrix.dtype.kind == "c":
+            return getattr(core, name + "_complex")
+    return getattr(core, name)
 
 
 def _matrix(function: str, a: ArrayLike, is_square: bool = False, argument: str = "a") -> NDArray[Any]:
@@ -209,7 +211,10 @@ def _matrix(function: str, a: ArrayLike, is_square: bool = False, argument: str 
 
 def _each(function: Any, *stacks: Any) -> Any:
     """The function of matrices over the stacks of them."""
-    if all(stack.ndim == 2 for stack in stacks):
+    for stack in stacks:
+        if stack.ndim != 2:
+            break
+    else:
         return function(*stacks)
     shape = np.broadcast_shapes(*(stack.shape[:-2] for stack in stacks))
     flat = [np.broadcast_to(stack, shape + stack.shape[-2:]).reshape(-1, *stack.shape[-2:]) for stack in stacks]
@@ -240,7 +245,7 @@ def _sides(function: str, a: NDArray[Any], b: ArrayLike) -> tuple[NDArray[Any], 
 def _factors(function: Any, a: Any) -> Any:
     """The LU factors and pivots of a matrix that is not singular."""
     (lu, pivots, _), kept = keeping(_served("lu", a), a)
-    if kept or not np.all(np.diagonal(lu)):
+    if kept or not lu.diagonal().all():
         refuse(function, "a", "is singular: a pivot is 0", "ErrSingularMatrix")
     return lu, pivots
 
@@ -250,6 +255,11 @@ def _warn_of(function: Any, condition: Any) -> None:
         digits = max(0, math.floor(-math.log10(EPS * condition))) if condition < np.inf else 0
         warn(QxWarning(f"qx.{function}", 20006, f"qx.{function}: a is badly conditioned, {condition:.1e}: of the "
                        f"result about {digits} digits are certain"))
+
+
+def _largest_column(a: NDArray[Any]) -> Any:
+    """The largest sum of magnitudes of a column."""
+    return np.maximum.reduce(np.add.reduce(np.abs(a), 0))
 
 
 ASSUMPTIONS = {"general": "general", "positive": "positive", "lower": "lower", "upper": "upper"}
@@ -379,7 +389,7 @@ def inv(a: ArrayLike) -> NDArray[Any]:
     def of_one(a: Any) -> Any:
         lu, pivots = _factors("linalg.inv", a)
         found = _served("solve_inverse", a)(lu, pivots)
-        _warn_of("linalg.inv", np.abs(a).sum(0).max() * np.abs(found).sum(0).max())
+        _warn_of("linalg.inv", _largest_column(a) * _largest_column(found))
         return found
 
     return _each(of_one, a)
@@ -442,7 +452,8 @@ def det(a: ArrayLike) -> Any:
     >>> qx.linalg.det([[2.0, 1.0], [1.0, 3.0]])
     5.0
     """
-    return _each(lambda a: _served("det", a)(a, 0), _matrix("linalg.det", a, True))
+    a = _matrix("linalg.det", a, True)
+    return _served("det", a)(a, 0) if a.ndim == 2 else _each(lambda a: _served("det", a)(a, 0), a)
 
 
 def trace(a: ArrayLike) -> Any:

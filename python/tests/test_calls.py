@@ -336,6 +336,31 @@ class Scalars(unittest.TestCase):
         self.assertLess(caught.exception.code, 0)
         self.assertEqual(qx.call("NormDist_head", [-np.inf, np.inf]).tolist(), [0.0, 1.0])
 
+    @unittest.skipUnless("QX_BesselJr" in qx.names(), "not in this build")
+    def test_few_elements_are_those_of_single_calls(self):
+        x = np.linspace(0.1, 9, 12)
+        by_shape = {shape: x.reshape(shape) for shape in ((12,), (3, 4), (1, 1, 12))}
+        for values in (*by_shape.values(), x[::-1], x[::2], x.astype(np.float32), x.astype(">f8")):
+            expected = [qx.QX_BesselJr(0.5, float(v)) for v in values.ravel()]
+            for _ in range(2):  # the second call has the memory of the first
+                found = qx.QX_BesselJr(0.5, values)
+                self.assertEqual(found.tolist(), np.reshape(expected, values.shape).tolist())
+        first = qx.QX_BesselJr(0.5, x)
+        kept = first.copy()
+        qx.QX_BesselJr(0.5, x + 1)
+        self.assertEqual(first.tolist(), kept.tolist())
+        for part, several in enumerate(qx.QX_EllipticJ(x, 0.5)):
+            self.assertEqual(several.tolist(), [qx.QX_EllipticJ(float(v), 0.5)[part] for v in x])
+
+    def test_a_code_among_few_elements_is_told_and_forgotten(self):
+        orders = np.array([1, 2, 0, 3], np.int32)
+        for _ in range(2):
+            with self.assertRaisesRegex(qx.QxError, "at element 2"):
+                qx.TDist_head(1.0, orders)
+            self.assertEqual(qx.TDist_head(1.0, orders + 1).tolist(),
+                             [qx.TDist_head(1.0, int(n) + 1) for n in orders])
+        self.assertRaises(TypeError, qx.TDist_head, np.ones(4), np.ones(4))
+
     @unittest.skipUnless("QX_CxBesselJr" in qx.names(), "not in this build")
     def test_functions_of_complex_numbers_map_over_arrays(self):
         z = np.array([[1 + 2j, -3.0], [complex(-2, -0.0), 40j]])

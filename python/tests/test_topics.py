@@ -3,6 +3,7 @@
 import doctest
 import importlib
 import inspect
+import itertools
 import pickle
 import subprocess
 import sys
@@ -130,6 +131,22 @@ class Axes(unittest.TestCase):
             nested = along(lambda channel: along(alone, np.stack([channel] * 2))[1], x)
         self.assertEqual(found.tobytes(), np.stack([qx.fft.rfft(row) for row in x]).tobytes())
         self.assertEqual(nested.tobytes(), found.tobytes())
+
+    def test_large_results_of_channels_are_what_they_are_alone(self):
+        x = np.random.default_rng(1).normal(size=(3, 2, axes.LARGE // 8))
+        ramp = itertools.count()
+        for alone in (lambda channel: channel, lambda channel: channel[::-1], lambda channel: (channel[0], channel * 2),
+                      lambda channel: channel * (1j if channel[0] > 0 else 1)):
+            parts = [[alone(channel) for channel in row] for row in x]
+            found, single = along(alone, x), not isinstance(parts[0][0], tuple)
+            for which, one in enumerate((found,) if single else found):
+                expected = [[part if single else part[which] for part in row] for row in parts]
+                self.assertEqual(one.tolist(), np.array(expected).tolist())
+                self.assertFalse(np.shares_memory(one, x))
+        uneven = along(lambda channel: np.ones(len(channel) + next(ramp)), x)
+        self.assertEqual(sorted(len(one) - x.shape[2] for one in uneven.ravel()), list(range(6)))
+        np.testing.assert_array_equal(along(lambda channel: channel + 1, np.moveaxis(x, -1, 0), 0),
+                                      np.moveaxis(x, -1, 0) + 1)
 
     def test_failures_and_warnings_of_threads_reach_the_caller(self):
         x = np.ones((4, 20000))

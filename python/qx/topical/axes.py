@@ -22,6 +22,7 @@ from ..outcomes import keeping, warn
 Channel = Callable[[NDArray[Any]], Any]  # a function of one channel
 
 ENOUGH = 1 << 15  # elements from which on threads are worth their while
+LARGE = 1 << 16  # bytes of a result from which on it is copied at once to where it belongs
 
 
 class _Last(int):
@@ -88,6 +89,8 @@ def is_pandas(x: object) -> bool:
 
 def as_array(x: ArrayLike) -> NDArray[Any]:
     """x as an array of numbers; masked values are refused, since no export knows of a mask."""
+    if type(x) is np.ndarray:
+        return x
     if isinstance(x, np.ma.MaskedArray) and np.ma.is_masked(x):
         raise ValueError(f"{np.ma.count_masked(x)} elements are masked: fill or compress the array")
     return np.asarray(x)
@@ -135,11 +138,46 @@ def _along(function: Channel, x: NDArray[Any], axis: int) -> Any:
     if x.ndim == 1:
         return function(x)
     flat, moved = _flat(x, axis)
-    found = many(function, flat, x.size)
-    place = axis % x.ndim
+    rows = _Rows(len(flat))
+    found = many(lambda i: rows.kept(i, function(flat[i])), range(len(flat)), x.size)
+    shape, place = moved.shape[:-1], axis % x.ndim
     if isinstance(found[0], tuple):
-        return tuple(_together(parts, moved.shape[:-1], place) for parts in zip(*found))
-    return _together(found, moved.shape[:-1], place)
+        return tuple(_together(rows.whole(which, parts), shape, place) for which, parts in enumerate(zip(*found)))
+    return _together(rows.whole(0, found), shape, place)
+
+
+class _Rows:
+    """The large results of channels in one array from the start: each is copied into its row as soon as it is
+    there, while the processor's cache has it, and its own memory serves the next channel. What does not fit
+    the rows, which the first result decides on, stays as it is."""
+
+    def __init__(self, count: int) -> None:
+        self.count, self.lock = count, threading.Lock()
+        self.arrays: dict[int, NDArray[Any]] = {}  # by the place in a tuple
+        self.filled: dict[int, int] = {}  # how many rows are
+
+    def kept(self, i: int, found: Any) -> Any:
+        """What is kept of the result of channel i."""
+        if isinstance(found, tuple):
+            return tuple(self._row(i, place, part) for place, part in enumerate(found))
+        return self._row(i, 0, found)
+
+    def _row(self, i: int, place: int, found: Any) -> Any:
+        if type(found) is not np.ndarray or found.ndim != 1 or found.nbytes < LARGE:
+            return found
+        with self.lock:
+            array = self.arrays.get(place)
+            if array is None:
+                array = self.arrays[place] = np.empty((self.count, len(found)), found.dtype)
+            if len(found) != array.shape[1] or found.dtype != array.dtype:
+                return found
+            self.filled[place] = self.filled.get(place, 0) + 1
+        array[i] = found
+        return array[i]
+
+    def whole(self, place: int, parts: Sequence[Any]) -> Sequence[Any] | NDArray[Any]:
+        """The array of all results, or these where they are not all in it."""
+        return self.arrays[place] if self.filled.get(place) == self.count else parts
 
 
 def by_channel(function: Channel, x: ArrayLike, axis: int = LAST) -> Any:
@@ -173,14 +211,15 @@ def along_pairs(function: Callable[[NDArray[Any], NDArray[Any]], float], x: Arra
     return np.array(found).reshape(shape) if shape else found[0]
 
 
-def _together(parts: Sequence[Any], shape: tuple[int, ...], place: int) -> NDArray[Any]:
+def _together(parts: Sequence[Any] | NDArray[Any], shape: tuple[int, ...], place: int) -> NDArray[Any]:
     """The results of all channels as one array, with the channel's results along the axis `place`."""
     first = np.asarray(parts[0])
-    if any(np.shape(part) != first.shape for part in parts):
+    if not isinstance(parts, np.ndarray) and any(np.shape(part) != first.shape for part in parts):
         together = np.empty(len(parts), object)
         together[:] = parts
         return together.reshape(shape)
-    together = np.stack(parts).reshape(*shape, *first.shape)
+    whole = parts if isinstance(parts, np.ndarray) else np.stack(parts)
+    together = whole.reshape(*shape, *first.shape)
     return np.moveaxis(together, -1, place) if first.ndim == 1 else together
 
 
