@@ -5,7 +5,7 @@ import dataclasses
 import numpy as np
 
 from . import filters
-from .calls import call
+from .topical import served
 
 TYPES = ("lowpass", "highpass", "bandpass", "bandstop")
 FAMILIES = {  # function, and which levels it takes
@@ -119,5 +119,5 @@ def stages_of(kind, edges, rate, ripple, attenuation):
     else:
         outer, inner, center = edges[3] - edges[0], edges[2] - edges[1], sum(edges) / 4
         passed, stopped = (inner, outer) if kind == "bandpass" else (outer, inner)
-    return call("FIRNarrowCoef_head", rate, passed, stopped, center, 10 ** (ripple / 20) - 1, attenuation,
-                TYPES.index(kind), {})
+    return served("filters").narrow(rate, passed, stopped, center, 10 ** (ripple / 20) - 1, attenuation,
+                                    TYPES.index(kind), {})

@@ -8,8 +8,11 @@ import dataclasses
 
 import numpy as np
 
-from .calls import call
+from . import calculus, filters, multirate, signals, stats
 from .outcomes import QxError
+from .topical import served
+
+core, smoothing = served("measure"), served("filters")
 
 WHOLE_STREAM = 5  # first and last block
 AUTOMATIC, BINS = 2, 100
@@ -73,7 +76,7 @@ def outstanding(found):
 def vertices(values, maxima, frame):
     """Places, heights and curvatures of the parabolas through `frame` samples around each maximum,
     where they have their vertex among them; else of the sample."""
-    fit = call("SavitzkyGolayCoefH", 2, frame, [], 1)[1]
+    fit = smoothing.savgol_coefficients(2, frame, filters.EMPTY, 1)[1]
     first = np.clip(maxima - frame // 2, 0, len(values) - frame)
     c0, c1, c2 = fit @ np.lib.stride_tricks.sliding_window_view(values, frame)[first].T
     with np.errstate(divide="ignore", invalid="ignore"):
@@ -87,7 +90,7 @@ def prominent_peaks(values, width, prominence=None):
     """Peaks of the values, smoothed by parabolas over `width` samples, of this prominence at least; of
     outstanding() prominence where it is None."""
     frame = width + (width + 1) % 2
-    smooth = call("SavitzkyGolayFiltH", values, 2, frame, [])
+    smooth = filters.savgol(values, frame, 2)
     maxima = local_maxima(smooth)
     stand = prominences(smooth, maxima)
     if prominence is None:
@@ -101,7 +104,7 @@ def prominent_peaks(values, width, prominence=None):
 def peaks_beyond(values, threshold, width, valleys):
     request = {"data": values, "threshold": threshold, "width": width, "polarity": int(valleys),
                "flags": WHOLE_STREAM}
-    found = call("PeakD", request, {}, [])[0]
+    found = core.PeakFinder(request, {}, [])[0]
     return Peaks(found["locations"], found["amplitudes"], found["derivatives"])
 
 
@@ -128,9 +131,9 @@ REFRACTORY = 2.5  # events follow each other no faster, in its multiples
 
 def activity(values, step):
     """The root mean square slope of the values around every `step`-th sample, by the largest slope."""
-    means = call("DecimateCIN", values, step, 1)
-    slopes = call("Derivative", means, means[0], means[-1], 1.0)
-    power = call("Convolution", (slopes / (np.abs(slopes).max() or 1.0))**2, np.full(STEPS, 1 / STEPS), 0)
+    means = multirate.decimate(values, step, "average")
+    slopes = calculus.derivative(means)
+    power = signals.convolve((slopes / (np.abs(slopes).max() or 1.0))**2, np.full(STEPS, 1 / STEPS), method="direct")
     # A moving mean over an even number: half a step late.
     return np.sqrt(np.maximum(power[STEPS // 2:][:len(slopes)], 0))
 
@@ -155,8 +158,8 @@ def events(values, rate):
         return np.zeros(0)
     strength = activity(values, step)
     largest = np.sort(strength)[-(len(strength) // 10):]
-    level = call("Median_head", largest) / 2
-    if level <= QUIET * call("Median_head", strength):
+    level = stats.median(largest) / 2
+    if level <= QUIET * stats.median(strength):
         return np.zeros(0)
     bursts = peaks(strength, level, 9)
     centres = separated(bursts.places, bursts.values, REFRACTORY * STEPS) * step + (step - 1) / 2
@@ -164,7 +167,7 @@ def events(values, rate):
     for centre in centres:
         first = max(0, round(centre) - length)
         part = values[first:round(centre) + length + 1]
-        away = np.abs(part - call("Median_head", part))
+        away = np.abs(part - stats.median(part))
         found.append(first + int(np.argmax(away)))
     found = np.unique(np.array(found, float))
     return found if len(found) >= 3 else np.zeros(0)
@@ -221,7 +224,7 @@ def levels(values, method=AUTOMATIC, bins=BINS):
     """High and low level as pairs with their standard uncertainties. Modes of the histogram, which are
     centres of bins, are refined by the samples about them; extremes, where the waveform has no modes,
     are what they are."""
-    high, low, _ = call("StateLevels", values, 0.0, 1.0, method, bins, 0)
+    high, low, _ = core.levels(values, 0.0, 1.0, method, bins, 0)
     least, greatest = float(values.min()), float(values.max())
     width = (greatest - least) / bins
     if high == greatest and low == least or not width > 0:
@@ -239,9 +242,9 @@ def references(high, low):
 
 def transition(values, direction, number, high, low):
     """slewRate, duration, start, end and the overshoot in its direction, between refined levels."""
-    found = call("TransMeas", values, 0.0, 1.0, direction, number, references(high, low), HISTOGRAM, 0)[1:]
+    found = core.pulses_transition(values, 0.0, 1.0, direction, number, references(high, low), HISTOGRAM, 0)[1:]
     under, over = found[-2:]
-    modes = call("StateLevels", values, 0.0, 1.0, AUTOMATIC, BINS, 0)[:2]
+    modes = core.levels(values, 0.0, 1.0, AUTOMATIC, BINS, 0)[:2]
     # The export refers to the modes of the histogram.
     share, beyond = (over, modes[0] - high) if direction == RISING else (under, low - modes[1])
     excess = share / 100 * (modes[0] - modes[1]) + beyond
@@ -252,8 +255,8 @@ def pulse(values, number=1, direction=RISING):
     """Pulse `number` that begins with an edge of this direction, or None where there is none."""
     try:
         (high, high_error), (low, low_error) = levels(values)
-        width, middle = (call("PulseMeasEx", values, 0.0, 1.0, direction, 1, number, references(high, low),
-                              HISTOGRAM, 0)[i] for i in (1, 3))
+        width, middle = (core.pulses(values, 0.0, 1.0, direction, 1, number, references(high, low),
+                                     HISTOGRAM, 0)[i] for i in (1, 3))
         first = transition(values, direction, number, high, low)
         second = transition(values, 1 - direction, number, high, low)
         if second[2] < first[3]:  # the waveform begins with an edge of the other direction
@@ -283,13 +286,13 @@ def event_pulse(values, places, i):
     if not 0 < i < len(places) - 1:
         return None
     part = slice(int((places[i - 1] + places[i]) / 2), int((places[i] + places[i + 1]) / 2))
-    rises = values[int(places[i])] > call("Median_head", values[part])
+    rises = values[int(places[i])] > stats.median(values[part])
     found = pulse(values[part], 1, RISING if rises else FALLING)
     return (found, part) if found else None
 
 
 def typical_event(values, places):
     """The event_pulse of middling height among those that have one, else None."""
-    heights = np.abs(values[places.astype(int)] - call("Median_head", values))
-    order = np.argsort(np.abs(heights - call("Median_head", heights)), kind="stable")
+    heights = np.abs(values[places.astype(int)] - stats.median(values))
+    order = np.argsort(np.abs(heights - stats.median(heights)), kind="stable")
     return next(filter(None, (event_pulse(values, places, i) for i in order)), None)

@@ -1,10 +1,13 @@
 """What all topics share: places of names, axes, threads, pandas, words and refusals, results, streams."""
 
+import ast
 import doctest
+import functools
 import importlib
 import inspect
 import itertools
 import pickle
+import re
 import subprocess
 import sys
 import threading
@@ -21,9 +24,11 @@ from hypothesis import strategies
 PYTHON = Path(__file__).resolve().parent.parent
 sys.path.insert(0, str(PYTHON))
 import qx  # noqa: E402
+from qx import measuring  # noqa: E402
 from qx.topical import LAST, Result, along, axes, newest, result, words  # noqa: E402
 
 TOPICS = {name: importlib.import_module(f"qx.{name}") for name in newest.TOPICS}
+SERVED = {export for keys in newest.NEWEST.values() for export in keys.values()}
 SECTIONS = ("Parameters\n", "Returns\n", "Examples\n")
 
 # The same cases in each run, and no folder of earlier ones.
@@ -57,6 +62,46 @@ class Names(unittest.TestCase):
         tool = PYTHON.parent / "tools/topics_table.py"
         self.assertEqual(subprocess.run([sys.executable, tool, "--check"]).returncode, 0,
                          f"{tool} writes docs/topics.md")
+
+    def test_every_export_is_served_or_compared_with(self):
+        rows = re.findall(r"(?m)^\| `(\w+)` \| (.*) \|$", (PYTHON.parent / "docs/topics.md").read_text("utf-8"))
+        self.assertEqual(sorted(export for export, _ in rows), sorted(qx.names()))
+        for export, text in rows:
+            places = re.findall(rf"\b((?:{'|'.join(TOPICS)})\.[\w.]*\w)", text)
+            self.assertTrue(places or text.startswith(("for hosts", "NumPy: ")), f"{export}: {text}")
+            for place in places:
+                topic, *names = place.split(".")
+                self.assertIn(names[0], TOPICS[topic].__all__, f"{export}: {place}")
+                functools.reduce(getattr, names, TOPICS[topic])  # methods, too
+            if places and export not in SERVED:
+                self.assertIn("(elder, for comparison)", text, export)
+
+    def test_topics_call_the_newest_revision(self):
+        page, known = (PYTHON.parent / "docs/revisions.md").read_text("utf-8"), set(qx.names())
+        pairs = [(set(re.findall(r"`(\w+)`", elder)) & known, set(re.findall(r"`(\w+)`", revision)) & known)
+                 for elder, revision in re.findall(r"(?m)^\| (`[^|]*) \| (`[^|]*) \|", page)]
+        self.assertGreaterEqual(len(pairs), 40)
+        elders = {elder: revisions for names, revisions in pairs for elder in names if revisions}
+        for topic, keys in newest.NEWEST.items():
+            for key, export in keys.items():
+                self.assertNotIn(export, elders, f"{topic}.{key}: {elders.get(export)}")
+
+    def test_every_key_of_the_table_is_used(self):
+        """By `core.KEY`, or by its name in a text, whole or in two parts, without "_complex" and the like."""
+        for topic, keys in newest.NEWEST.items():
+            files = [TOPICS[topic].__file__, *[measuring.__file__] * (topic == "measure")]
+            nodes = [node for file in files for node in ast.walk(ast.parse(Path(file).read_text("utf-8")))]
+            called = {node.attr for node in nodes if isinstance(node, ast.Attribute)}
+            texts = {node.value for node in nodes if isinstance(node, ast.Constant)}
+            for key in keys:
+                named = {key, *(key.removesuffix(ending) for ending in ("_complex", "_single", "_sized"))}
+                name, _, ending = key.rpartition("_")
+                self.assertTrue(key in called or named & texts or {name, "_" + ending} <= texts, f"{topic}.{key}")
+
+    def test_the_workbench_calls_no_export_by_its_name(self):
+        for file in [*(PYTHON / "qx").glob("*.py"), *(PYTHON / "qx/commands").glob("*.py")]:
+            if file.name not in ("__init__.py", "calls.py", "exports.py"):
+                self.assertNotRegex(file.read_text("utf-8"), r"(?<!def )\b(?:call|export)\(\"", file.name)
 
     def test_every_function_has_a_text_with_its_arguments(self):
         for topic, module in TOPICS.items():

@@ -22,7 +22,7 @@ NEWEST = {
         "narrow": "FIRNarrowCoef_head", "narrow_filter": "FIRnarrowFilter_head",
         "butterworth": "BWCoefs2026", "chebyshev1": "ChebyshevCoefs2026", "chebyshev2":
         "InvChebyshevCoefs2026", "elliptic": "EllipticCoefs2026", "bessel": "BesselCoefs2026",
-        "windowed": "FIRCoefs", "windowed_window": "AllWinH", "equiripple": "Parks",
+        "windowed": "FIRCoefs", "equiripple": "Parks",
         "Filter_cascade": "IIR_Filter2", "Filter_cascade_complex": "CxSigIIR_Filter2",
         "Filter_direct": "IIR_Filter", "Filter_direct_complex": "CxSigIIR_Filter",
         "Filter_complex": "CxIIR_Filter_H", "Filter_complex_of_real": "CxIIRReSig_Filter_H",
