@@ -330,8 +330,18 @@ def std(x: ArrayLike, axis: int = LAST, ddof: int = 0) -> Any:
     return np.sqrt(var(x, axis, ddof))
 
 
+def _standardized(channel: NDArray[Any], order: int) -> float:
+    """The central moment by that power of the standard deviation; NaN where all values are equal, since what
+    the mean is rounded by is no spread."""
+    if len(channel) and channel.min() == channel.max():
+        return math.nan
+    moment, variance = np.float64(core.moment(channel, order)), np.float64(core.moment(channel, 2))
+    with np.errstate(all="ignore"):
+        return float(moment / variance ** (order / 2))
+
+
 def skew(x: ArrayLike, axis: int = LAST) -> Any:
-    """The skewness: the third central moment by the power 3/2 of the second.
+    """The skewness: the third central moment by the power 3/2 of the second; NaN where all values are equal.
 
     Parameters
     ----------
@@ -355,11 +365,11 @@ def skew(x: ArrayLike, axis: int = LAST) -> Any:
     >>> round(qx.stats.skew([1.0, 2.0, 6.0]), 6)
     0.59517
     """
-    return along(lambda channel: core.moment(channel, 3) / core.moment(channel, 2)**1.5, x, axis)
+    return along(lambda channel: _standardized(channel, 3), x, axis)
 
 
 def kurtosis(x: ArrayLike, axis: int = LAST, fisher: bool = True) -> Any:
-    """The kurtosis: the fourth central moment by the square of the second.
+    """The kurtosis: the fourth central moment by the square of the second; NaN where all values are equal.
 
     Parameters
     ----------
@@ -385,7 +395,7 @@ def kurtosis(x: ArrayLike, axis: int = LAST, fisher: bool = True) -> Any:
     >>> round(qx.stats.kurtosis([1.0, 2.0, 6.0]), 6)
     -1.5
     """
-    return along(lambda channel: core.moment(channel, 4) / core.moment(channel, 2)**2, x, axis) - 3 * bool(fisher)
+    return along(lambda channel: _standardized(channel, 4), x, axis) - 3 * bool(fisher)
 
 
 def median(x: ArrayLike, axis: int = LAST) -> Any:
@@ -568,6 +578,15 @@ def anova(*samples: ArrayLike, significance: float = 0.05) -> Anova:
     1.5
     """
     groups = [as_array(one).astype(float).ravel() for one in samples]
+    if len(groups) < 2:
+        refuse("stats.anova", "samples", f"at least two are needed; {len(groups)} came", "ErrAnovaFewLevels")
+    for i, group in enumerate(groups):
+        if not len(group):
+            refuse("stats.anova", "samples", f"sample {i} is empty", "ErrEmptyInput")
+        if not np.all(np.isfinite(group)):
+            refuse("stats.anova", "samples", f"sample {i} has a value that is not finite", "ErrNaNInData")
+    if len(groups) == sum(map(len, groups)):
+        refuse("stats.anova", "samples", "one of them must have two values", "ErrAnovaFewLevels")
     y = np.concatenate(groups) if groups else np.empty(0)
     labels = np.repeat(np.arange(len(groups), dtype=np.int32), [len(one) for one in groups])
     between, mean_between, ratio, p, error, mean_error, total, critical = core.anova(

@@ -242,6 +242,9 @@ class Statistics(unittest.TestCase):
         close(stats.std(x, ddof=1), x.std(1, ddof=1))
         close(stats.rms(1j * x[0]), stats.rms(x[0]))
         close(stats.moment(x, 3), scipy.stats.moment(x, 3, 1))
+        for constant in (0.1, -0.27829495, 3.0):  # whose mean is rounded, or not
+            self.assertTrue(np.isnan([stats.skew([constant] * 10), stats.kurtosis([constant] * 10)]).all())
+        self.assertFalse(np.isfinite(stats.skew([0, 1e150, 3e150])))
         table = pandas.DataFrame(x.T, columns=[*"abc"])
         self.assertEqual([*stats.mean(table).index], [*"abc"])
         self.assertRaises(ValueError, stats.var, [1.0], ddof=1)
@@ -270,6 +273,11 @@ class Statistics(unittest.TestCase):
         groups = [RNG.normal(size=n) + n / 20 for n in (8, 12, 9)]
         found = stats.anova(*groups)
         close([found.f[0], found.p[0]], scipy.stats.f_oneway(*groups), 1e-8)
+        for samples, rule in (([[1.0, 2.0]], "at least two are needed"), ([[1.0], [2.0]], "must have two values"),
+                              ([[1.0, 2.0], []], "sample 1 is empty"),
+                              ([[1.0, np.nan], [2.0]], "sample 0 has a value that is not finite")):
+            with self.assertRaisesRegex(ValueError, "qx.stats.anova: samples: .*" + rule):
+                stats.anova(*samples)
         y = RNG.normal(size=(2, 3, 4))
         a, b, _ = np.indices(y.shape)
         found = stats.anova2(y.ravel(), np.array(["u", "v"])[a.ravel()], b.ravel())
