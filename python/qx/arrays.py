@@ -12,6 +12,7 @@ import functools
 import numpy as np
 
 from .library import library
+from .outcomes import at
 
 TYPE_CODES = {"I32": 3, "U8": 5, "U32": 7, "SGL": 9, "DBL": 10, "CSG": 12, "CDB": 13}
 DTYPES = {"I32": np.dtype(np.int32), "U8": np.dtype(np.uint8), "U32": np.dtype(np.uint32),
@@ -143,25 +144,25 @@ class Kind:
         nothing but precision."""
         dtype = self.dtype
         if isinstance(value, np.ma.MaskedArray) and np.ma.is_masked(value):
-            raise ValueError(f"{place}: {np.ma.count_masked(value)} elements are masked, and an array "
+            raise ValueError(f"{at(place)}: {np.ma.count_masked(value)} elements are masked, and an array "
                              "of the library has no mask: fill or compress it")
         array = self._records(value, place) if dtype.names and not isinstance(value, np.ndarray) \
             else np.asarray(value)
         if array.ndim != self.dimensions:
-            raise ValueError(f"{place}: an array of {self.dimensions} dimension"
+            raise ValueError(f"{at(place)}: an array of {self.dimensions} dimension"
                              f"{'s'[:self.dimensions - 1]} is needed; {came(value)} came, which has "
                              f"{array.ndim}")
         if array.size > LARGEST:
-            raise ValueError(f"{place}: {array.size} elements are more than an array can have")
+            raise ValueError(f"{at(place)}: {array.size} elements are more than an array can have")
         if array.dtype == dtype or array.size == 0:
             return array
         if not np.can_cast(array.dtype, dtype, "same_kind") and not (
                 array.dtype.kind in "bui" and dtype.kind in "bui"):
-            raise TypeError(f"{place}: elements of {dtype} are needed; {array.dtype} came")
+            raise TypeError(f"{at(place)}: elements of {dtype} are needed; {array.dtype} came")
         if dtype.kind in "ui" and array.dtype.kind != "b":
             limits = np.iinfo(dtype)
             if array.min() < limits.min or array.max() > limits.max:
-                raise ValueError(f"{place}: a value lies outside {limits.min} to {limits.max}")
+                raise ValueError(f"{at(place)}: a value lies outside {limits.min} to {limits.max}")
         return array
 
     def _records(self, value, place):
@@ -170,7 +171,7 @@ class Kind:
         for row in value if isinstance(value, (list, tuple)) else [value]:
             if not isinstance(row, (tuple, list, np.void)) or (
                     len(row) != len(names)):  # type: ignore[arg-type]  # np.void has a length
-                raise TypeError(f"{place}: a list of tuples ({', '.join(names)}) is needed; {came(row)} came")
+                raise TypeError(f"{at(place)}: a list of tuples ({', '.join(names)}) is needed; {came(row)} came")
         return np.array([tuple(row) for row in value], self.dtype)
 
     def give_back(self, block):

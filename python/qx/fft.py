@@ -16,7 +16,7 @@ from typing import Any, Literal
 import numpy as np
 from numpy.typing import ArrayLike, NDArray
 
-from .topical import LAST, along, chosen, count_of, either, refuse, served, whole_number
+from .topical import LAST, along, chosen, count_of, either, positive, refuse, served, whole_number
 
 __all__ = ["czt", "dct", "dst", "dzt", "fft", "fft2", "fftfreq", "fftshift", "half_complex", "hartley",
            "hilbert", "iczt", "idct", "idst", "ifft", "ifft2", "ifftshift", "ihalf_complex",
@@ -38,7 +38,10 @@ def _scaled(spectrum: Any, function: Any, norm: Any, n: Any, axis: Any, forward:
 
 def _length(function: Any, n: Any, x: Any, axis: Any) -> int:
     if n is None:
-        return count_of(x, axis)
+        n = count_of(x, axis)
+        if not n:
+            refuse(function, "x", "is empty", "ErrEmptyInput")
+        return n
     return whole_number(function, "n", n, 1, "ErrFFTSizeNotPositive")
 
 
@@ -318,7 +321,7 @@ def fftfreq(n: int, d: float = 1.0) -> NDArray[np.float64]:
     array([   0.,  250., -500., -250.])
     """
     n = whole_number("fft.fftfreq", "n", n, 1, "ErrFFTSizeNotPositive")
-    return np.fft.fftfreq(n, d)
+    return np.fft.fftfreq(n, positive("fft.fftfreq", "d", d, "ErrSamplingNotPositive"))
 
 
 def rfftfreq(n: int, d: float = 1.0) -> NDArray[np.float64]:
@@ -347,7 +350,7 @@ def rfftfreq(n: int, d: float = 1.0) -> NDArray[np.float64]:
     array([  0., 200., 400.])
     """
     n = whole_number("fft.rfftfreq", "n", n, 1, "ErrFFTSizeNotPositive")
-    return np.fft.rfftfreq(n, d)
+    return np.fft.rfftfreq(n, positive("fft.rfftfreq", "d", d, "ErrSamplingNotPositive"))
 
 
 def fftshift(x: ArrayLike, axis: int = LAST) -> NDArray[Any]:
@@ -370,6 +373,7 @@ def fftshift(x: ArrayLike, axis: int = LAST) -> NDArray[Any]:
     >>> qx.fft.fftshift([0, 1, 2, -2, -1])
     array([-2, -1,  0,  1,  2])
     """
+    count_of(x, axis)  # refuses what has no such axis
     return np.fft.fftshift(x, axis)
 
 
@@ -393,6 +397,7 @@ def ifftshift(x: ArrayLike, axis: int = LAST) -> NDArray[Any]:
     >>> qx.fft.ifftshift([-2, -1, 0, 1, 2])
     array([ 0,  1,  2, -2, -1])
     """
+    count_of(x, axis)  # refuses what has no such axis
     return np.fft.ifftshift(x, axis)
 
 
@@ -903,5 +908,6 @@ def zoom(x: ArrayLike, band: tuple[float, float], m: int | None = None, fs: floa
     if np.shape(band) != (2,):
         refuse("fft.zoom", "band", f"two frequencies are needed; {band!r} came", "ErrSizesDisagree")
     m = count_of(x, axis) if m is None else whole_number("fft.zoom", "m", m, 1)
+    fs = positive("fft.zoom", "fs", fs, "ErrSamplingNotPositive")
     first, end = (float(edge) / fs for edge in band)
     return czt(x, m, np.exp(-2j * np.pi * (end - first) / m), np.exp(2j * np.pi * first), axis)

@@ -18,7 +18,7 @@ import numpy as np
 
 from . import arrays, plans
 from .library import library
-from .outcomes import tell
+from .outcomes import at, tell
 from .pointers import GIVES_BACK, address, pointer
 from .procedures import FIT, Procedure
 from .records import Record
@@ -333,7 +333,7 @@ def buffer(value, element, count, place):
     kind = arrays.kind(element, 1)
     array = np.array(kind.checked(value, place), kind.dtype)
     if array.size < count:
-        raise ValueError(f"{place}: {count} elements are needed; {array.size} came")
+        raise ValueError(f"{at(place)}: {count} elements are needed; {array.size} came")
     return array
 
 
@@ -374,7 +374,7 @@ def _spread(values, columns):
     checked, shape = [], None
     for value, (_, dtype, element, _, place) in zip(values, (column for column in columns if column[0])):
         if isinstance(value, (str, bytes)):
-            raise TypeError(f"{place}: a number is needed; {shown(value)} came")
+            raise TypeError(f"{at(place)}: a number is needed; {shown(value)} came")
         is_single = type(value) is float and element == "DBL" or type(value) is int and (
             element == "I32" and -2**31 <= value < 2**31)
         if not is_single:

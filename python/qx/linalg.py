@@ -15,7 +15,7 @@ import numpy as np
 from numpy.typing import ArrayLike, NDArray
 
 from .outcomes import QxWarning, keeping, warn
-from .topical import Result, chosen, refuse, result, served, whole_number
+from .topical import Result, chosen, refuse, result, served, vector, whole_number
 from .topical.axes import as_array, many
 
 __all__ = ["Eigen", "GSVD", "Hessenberg", "LU", "LeastSquares", "QR", "QZ", "SVD", "Schur", "balance",
@@ -1541,8 +1541,8 @@ def toeplitz(c: ArrayLike, r: ArrayLike | None = None) -> NDArray[Any]:
            [2., 1., 2.],
            [3., 2., 1.]])
     """
-    c = as_array(c)
-    r = c.conj() if r is None else as_array(r)
+    c = vector(c, "linalg.toeplitz", "c")
+    r = c.conj() if r is None else vector(r, "linalg.toeplitz", "r")
     return _served("toeplitz", c, r)(2, len(c), c, r)
 
 

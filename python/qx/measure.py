@@ -15,8 +15,8 @@ from numpy.typing import ArrayLike, NDArray
 
 from . import measuring, windows
 from .outcomes import QxError
-from .topical import (LAST, Result, Stream, along, along_pairs, by_channel, chosen, count_of, refuse, result, served,
-                      whole_number)
+from .topical import (LAST, Result, Stream, along, along_pairs, by_channel, chosen, count_of, positive, refuse, result,
+                      served, whole_number)
 
 if TYPE_CHECKING:
     from . import filters
@@ -241,9 +241,7 @@ class Bands(Result):
 
 
 def _rate(function: Any, fs: Any) -> Any:
-    if not fs > 0:
-        refuse(f"measure.{function}", "fs", f"must be above 0; {fs} came", "ErrSamplingNotPositive")
-    return float(fs)
+    return positive(f"measure.{function}", "fs", fs, "ErrSamplingNotPositive")
 
 
 def peaks(x: ArrayLike, fs: float = 1.0, height: float | None = None, prominence: float | None = None,
@@ -878,6 +876,7 @@ def _refined(x: Any, y: Any, lag: Any) -> Any:
 
 WEIGHTINGS = {"A": "A", "C": "C", "Z": "Z"}
 _F1, _F2, _F3, _F4 = 20.598997, 107.65265, 737.86223, 12194.217
+MOST_BANDS = 1000  # in an octave
 _BAND_RATIO = 10 ** 0.3  # an octave, by IEC 61260-1
 
 
@@ -1114,8 +1113,11 @@ def band_frequencies(fraction: int = 3, low: float = 25.0, high: float = 20000.0
             1995.26,  3981.07,  7943.28, 15848.93])
     """
     fraction = whole_number("measure.band_frequencies", "fraction", fraction, 1)
-    if not 0 < low <= high:
-        refuse("measure.band_frequencies", "low, high", "must be above 0 and in order", "ErrRangeReversed")
+    if fraction > MOST_BANDS:
+        refuse("measure.band_frequencies", "fraction", f"must be at most {MOST_BANDS}; {fraction} came",
+               "ErrRangeReversed")
+    if not 0 < low <= high < math.inf:
+        refuse("measure.band_frequencies", "low, high", "must be above 0, finite and in order", "ErrRangeReversed")
     shift = 0.0 if fraction % 2 else 0.5  # even fractions have no band at 1 kHz
     step = 0.3 / fraction
 

@@ -53,6 +53,10 @@ def low_pass(up: int, down: int, attenuation: float = ATTENUATION,
     >>> len(qx.multirate.low_pass(3, 2))
     483
     """
+    up, down = (whole_number("multirate.low_pass", name, value, 1, "ErrNotStrictlyPositive")
+                for name, value in (("up", up), ("down", down)))
+    if max(up, down) >= 2**31:
+        refuse("multirate.low_pass", "up, down", f"must be below 2^31; {up} and {down} came", "ErrSizesDisagree")
     edge = 1 / max(up, down)  # of the lower band, 1 being half the rate of the grid
     width = edge * (1 - passband)
     half = math.ceil((attenuation - 7.95) / (2.285 * math.pi * width) / 2)
@@ -211,8 +215,8 @@ def respace(x: ArrayLike, spacing: float, start: float = 0.0, axis: int = LAST) 
     True
     """
     name = "multirate.respace"
-    if not 0 < spacing < math.inf or not 0 <= start < math.inf:
-        refuse(name, "spacing, start", f"must be finite, above 0 and at least 0; {spacing} and {start} came",
+    if not 0 < spacing < 2**31 or not 0 <= start < math.inf:
+        refuse(name, "spacing, start", f"must be above 0 and below 2^31, and finite and at least 0; {spacing} and {start} came",
                "ErrSamplingNotPositive")
     kernel = _kernel()
     design = {"ratio": float(spacing), "mode": 0, "start": float(start), "proto": kernel, "oversample": OVERSAMPLE}

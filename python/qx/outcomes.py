@@ -11,7 +11,8 @@ from numpy.linalg import LinAlgError
 from .library import library
 
 HOST_FAILURES = (1, 2)  # statuses of the host that some exports pass on
-_PACKAGE = os.path.dirname(os.path.abspath(__file__))
+_PACKAGE = os.path.dirname(os.path.abspath(__file__)) + os.sep
+_NAME = __name__.rpartition(".")[0] + "."  # of the package's modules
 
 
 class QxError(Exception):
@@ -70,9 +71,40 @@ def kind_of(name, code=0):
     return QxError if name in _OTHERS or not name.startswith("Err") else ArgumentError
 
 
+def caller():
+    """The public function of a topic that is at work, such as "fft.rfft"; empty for a call of an export."""
+    found, frame = "", sys._getframe(1)
+    while frame and frame.f_code.co_filename.startswith((_PACKAGE, "<qx ")):
+        module = frame.f_globals.get("__name__", "").removeprefix(_NAME)
+        parts = getattr(frame.f_code, "co_qualname", frame.f_code.co_name).split(".")  # before Python 3.11 the last one
+        if "." not in module and parts[0] in frame.f_globals.get("__all__", ()):
+            found = ".".join([module, *(part for part in parts[:2] if not part.startswith(("__", "<")))])
+        frame = frame.f_back
+    return found
+
+
+def at(place):
+    """A place in an export's arguments as messages name it, behind the function of a topic that was called."""
+    function = caller()
+    return f"qx.{function}: {place}" if function else place
+
+
 def failure(export, code, results=None, place=""):
-    """The exception for a code, of the class that fits it."""
-    return kind_of(library().error_name(code), code)(export, code, results, place)
+    """The exception for a code, of the class that fits it. It names the function of a topic that was called."""
+    kind, function = kind_of(library().error_name(code), code), caller()
+    error = kind(export, code, results, place)
+    return kind(export, code, results, place, f"qx.{function}: {error}") if function else error
+
+
+def named(error):
+    """A failure out of a thread, which does not know what was called, under its name."""
+    function = caller()
+    if not function or str(error).startswith("qx."):
+        return error
+    text = f"qx.{function}: {error}"
+    if isinstance(error, QxError):
+        return type(error)(error.export, error.code, error.results, error.place, text)
+    return type(error)(text) if type(error) in (TypeError, ValueError) else error
 
 
 class QxWarning(UserWarning):

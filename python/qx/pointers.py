@@ -3,6 +3,7 @@ that was given back. A made-up address would end the process."""
 
 import ctypes
 
+from .outcomes import at
 from .scalars import shown
 
 GIVES_BACK = {"destroy_oxfft_table"}
@@ -34,9 +35,9 @@ def address(value, kind, place, gives_back):
     if kind == "void *" and isinstance(value, ctypes.CDLL):
         return value._handle
     if not isinstance(value, Pointer) or value.type != kind:
-        raise TypeError(f"{place}: a {kind} from an export is needed; {shown(value)} came")
+        raise TypeError(f"{at(place)}: a {kind} from an export is needed; {shown(value)} came")
     if value.address is None:
-        raise ValueError(f"{place}: it has been given back before")
+        raise ValueError(f"{at(place)}: it has been given back before")
     found = value.address
     if gives_back:
         value.address = None

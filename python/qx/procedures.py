@@ -4,6 +4,7 @@ import ctypes
 
 import numpy as np
 
+from .outcomes import at
 from .scalars import shown
 
 # The context is not needed: a function has its own.
@@ -17,7 +18,7 @@ class Procedure:
 
     def __init__(self, function, gives_rows, place):
         if function is not None and not callable(function):
-            raise TypeError(f"{place}: a function is needed; {shown(function)} came")
+            raise TypeError(f"{at(place)}: a function is needed; {shown(function)} came")
         self.raised = None
         self._function, self._gives_rows, self._place = function, gives_rows, place
         # Null where there is no function.
@@ -27,12 +28,12 @@ class Procedure:
         try:
             values = np.asarray(self._function(numbers(x, x_count).copy(), numbers(p, count).copy()))
             if np.iscomplexobj(values):
-                raise TypeError(f"{self._place}: real values are needed; complex ones came")
+                raise TypeError(f"{at(self._place)}: real values are needed; complex ones came")
             shape = (n, count) if self._gives_rows else (n,)
             try:
                 values = np.broadcast_to(values, shape)
             except ValueError:
-                raise ValueError(f"{self._place}: values of shape {shape} are needed; {values.shape} "
+                raise ValueError(f"{at(self._place)}: values of shape {shape} are needed; {values.shape} "
                                  "came") from None
             numbers(out, values.size)[:] = values.ravel()
         except BaseException as error:  # of any kind: none may pass through the export

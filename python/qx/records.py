@@ -9,6 +9,7 @@ import numpy as np
 
 from . import arrays
 from .library import library
+from .outcomes import at
 from .scalars import C_TYPES, COMPLEX, c_number, shown
 
 
@@ -46,11 +47,11 @@ class Record:
         self.fields = {field["name"]: field for field in library().records[name]["fields"]
                        if not is_pointer(field)}
         if not isinstance(contents, Mapping):
-            raise TypeError(f"{place}: a dictionary with fields of {name} is needed; "
+            raise TypeError(f"{at(place)}: a dictionary with fields of {name} is needed; "
                             f"{shown(contents)} came")
         for field in contents:
             if field not in self.fields:
-                raise ValueError(f"{place}: {name} has no field {field!r}; it has "
+                raise ValueError(f"{at(place)}: {name} has no field {field!r}; it has "
                                  f"{', '.join(self.fields)}")
         for field, description in self.fields.items():
             if "array" in description:
@@ -71,7 +72,7 @@ class Record:
             setattr(self.record, field, number if element in COMPLEX else number.value)
             return
         if np.shape(value) != (int(count),):
-            raise ValueError(f"{place}: {count} numbers are needed; {shown(value)} came")
+            raise ValueError(f"{at(place)}: {count} numbers are needed; {shown(value)} came")
         for i, one in enumerate(value):
             number = c_number(one, element, place)
             getattr(self.record, field)[i] = number if element in COMPLEX else number.value

@@ -7,6 +7,8 @@ import textwrap
 
 import numpy as np
 
+from .outcomes import at
+
 C_TYPES: dict[str, Any] = {
     "I16": ctypes.c_int16, "I32": ctypes.c_int32, "U8": ctypes.c_uint8, "U16": ctypes.c_uint16,
     "U32": ctypes.c_uint32, "SGL": ctypes.c_float, "DBL": ctypes.c_double, "CSG": ctypes.c_float * 2,
@@ -31,11 +33,11 @@ def whole(value, element, place):
         number = operator.index(value)
     except TypeError:
         if not (isinstance(value, float) and value.is_integer()):
-            raise TypeError(f"{place}: a whole number is needed; {shown(value)} came") from None
+            raise TypeError(f"{at(place)}: a whole number is needed; {shown(value)} came") from None
         number = int(value)
     lowest, highest = LIMITS[element]
     if not lowest <= number <= highest:
-        raise ValueError(f"{place}: {shown(number)} lies outside {lowest} to {highest}")
+        raise ValueError(f"{at(place)}: {shown(number)} lies outside {lowest} to {highest}")
     return number
 
 
@@ -45,7 +47,7 @@ def chosen(value, values, place):
     if number not in values:
         known = "; ".join(f"{value} {textwrap.shorten(text, 60, placeholder=' ...')}".rstrip()
                           for value, text in values.items())
-        raise ValueError(f"{place}: {shown(number)} is none of its values, which are {known}")
+        raise ValueError(f"{at(place)}: {shown(number)} is none of its values, which are {known}")
     return number
 
 
@@ -55,7 +57,7 @@ def real(value, place):
             return float(value)
     except (TypeError, ValueError):
         pass
-    raise TypeError(f"{place}: a number is needed; {shown(value)} came")
+    raise TypeError(f"{at(place)}: a number is needed; {shown(value)} came")
 
 
 def complex_parts(value, element, place):
@@ -65,7 +67,7 @@ def complex_parts(value, element, place):
             return C_TYPES[element](number.real, number.imag)
     except (TypeError, ValueError):
         pass
-    raise TypeError(f"{place}: a complex number is needed; {shown(value)} came")
+    raise TypeError(f"{at(place)}: a complex number is needed; {shown(value)} came")
 
 
 def c_number(value, element, place):

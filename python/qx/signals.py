@@ -12,7 +12,7 @@ from typing import Any, Literal
 import numpy as np
 from numpy.typing import ArrayLike, NDArray
 
-from .topical import LAST, along, chosen, refuse, served, vector, whole_number
+from .topical import LAST, along, chosen, positive, refuse, served, vector, whole_number
 from .topical.axes import as_array
 
 __all__ = ["arbitrary", "autocorrelate", "chirp", "convolve", "convolve2", "correlate", "correlate2",
@@ -690,7 +690,7 @@ def unwrap(x: ArrayLike, period: float = 2 * math.pi, axis: int = LAST) -> Any:
         return along(lambda channel: core.unwrap(channel, 0), x, axis)
     if period == 360:
         return along(lambda channel: core.unwrap(channel, 2), x, axis)
-    scale = 2 * math.pi / period
+    scale = 2 * math.pi / positive("signals.unwrap", "period", period)
     return along(lambda channel: core.unwrap(channel * scale, 0) / scale, x, axis)
 
 

@@ -13,7 +13,7 @@ import numpy as np
 from numpy.typing import ArrayLike, NDArray
 
 from . import windows
-from .topical import LAST, Result, along, chosen, count_of, either, refuse, result, served, whole_number
+from .topical import LAST, Result, along, chosen, count_of, either, positive, refuse, result, served, whole_number
 from .topical.axes import as_array, is_pandas
 
 __all__ = ["CrossSpectrum", "Spectrogram", "Spectrum", "TransferFunction", "analytic", "coherence", "csd",
@@ -182,8 +182,7 @@ class _Segments:
                  detrend: Any, scaling: Any, is_complex: Any) -> None:
         if n < 1:
             refuse(function, "x", "is empty", "ErrEmptyInput")
-        if not fs > 0:
-            refuse(function, "fs", f"must be above 0; {fs} came", "ErrSamplingNotPositive")
+        fs = positive(function, "fs", fs, "ErrSamplingNotPositive")
         if nperseg is None:
             nperseg = min(256, n) if isinstance(window, (str, tuple)) else np.size(window)
         self.length = min(whole_number(function, "nperseg", nperseg, 1), n)

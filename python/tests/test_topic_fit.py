@@ -418,7 +418,7 @@ class Channels(unittest.TestCase):
             self.same(call(self.x), alone, name)
             self.same(call(np.moveaxis(self.x, -1, 0), axis=0), alone, name)
             self.same(call(pandas.DataFrame(self.x[0].T)), alone[0], name)
-            self.assertRaisesRegex(ValueError, "axis 2", call, self.x[0], axis=2)
+            self.assertRaisesRegex(ValueError, "axis: 2", call, self.x[0], axis=2)
             self.assertRaisesRegex(ValueError, "no channel", call, np.empty((0, 9)))
 
     def test_delays_of_pairs(self):

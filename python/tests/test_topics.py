@@ -49,6 +49,42 @@ class Names(unittest.TestCase):
                 getattr(place, name)
         with self.assertRaisesRegex(AttributeError, "did you mean Mean_head"):
             qx.exports.Mean_hed
+        for topic, wrong, answer in (("fft", "rffft", "did you mean rfft"), ("fft", "csd", r"it is qx\.spectra\.csd"),
+                                     ("filters", "FIRCoefs", "did you mean"), ("linalg", "slove", "did you mean solve")):
+            with self.assertRaisesRegex(AttributeError, rf"qx\.{topic} has no function {wrong}; {answer}"):
+                getattr(TOPICS[topic], wrong)
+        self.assertFalse(hasattr(qx.fft, "_hidden"))
+
+    def test_failures_name_what_was_called(self):
+        column, rows = np.zeros((3, 1)), np.ones((2, 1 << 15), complex)
+        for call, kind, text in (
+                (lambda: qx.fft.rfft([]), ValueError, r"qx\.fft\.rfft: .*\(ErrEmptyInput"),
+                (lambda: qx.fft.rfft(np.zeros((2, 0))), ValueError, r"qx\.fft\.rfft: .*\(ErrEmptyInput"),
+                (lambda: qx.fft.rfft(1.0), ValueError, r"qx\.fft\.rfft: x: an array of at least one dimension"),
+                (lambda: qx.fft.fft(column, axis=2), ValueError, r"qx\.fft\.fft: axis: 2 is none of"),
+                (lambda: qx.fft.fft(column, axis=0.5), TypeError, r"qx\.fft\.fft: axis: a whole number"),
+                (lambda: qx.stats.skew([1j, 2]), TypeError, r"qx\.stats\.skew: .* elements of float64"),
+                (lambda: qx.stats.median(rows), TypeError, r"qx\.stats\.median: .* elements of float64"),
+                (lambda: qx.stats.moment(rows.real, -1), ValueError, r"qx\.stats\.moment: "),
+                (lambda: qx.filters.butterworth(2, 0.1)([]), ValueError, r"qx\.filters\.Filter: "),
+                (lambda: qx.special.expn(10**30, 1.0), ValueError, r"qx\.special\.expn: .*: n: "),
+                (lambda: qx.fft.idct([]), ValueError, r"qx\.fft\.idct: x: is empty"),
+                (lambda: qx.fft.rfftfreq(4, 0), ValueError, r"qx\.fft\.rfftfreq: d: must be above 0"),
+                (lambda: qx.fft.zoom([1.0, 2.0], (0, 1), fs=0), ValueError, r"qx\.fft\.zoom: fs: must be above 0"),
+                (lambda: qx.fft.fftshift(1.0), ValueError, r"qx\.fft\.fftshift: x: "),
+                (lambda: qx.spectra.welch([1.0, 2.0], np.inf), ValueError, r"qx\.spectra\.welch: fs: must be above"),
+                (lambda: qx.signals.unwrap([1.0, 2.0], 0), ValueError, r"qx\.signals\.unwrap: period: must be above"),
+                (lambda: qx.multirate.low_pass(np.inf, 2), TypeError, r"qx\.multirate\.low_pass: up: a whole"),
+                (lambda: qx.multirate.resample([1.0], 1e300), ValueError, r"qx\.multirate\.low_pass: up, down: "),
+                (lambda: qx.measure.band_frequencies(3, 25, np.inf), ValueError, "low, high: must be above 0, finite"),
+                (lambda: qx.measure.tone([1.0, 2.0], "fast"), TypeError, r"qx\.measure\.tone: fs: a number"),
+                (lambda: qx.multirate.respace([1.0], 1e308), ValueError, r"qx\.multirate\.respace: spacing, start: "),
+                (lambda: qx.fft.dzt([1.0], 0, 1e308), ValueError, r"qx\.fft\.dzt: size: .* is too large"),
+                (lambda: qx.linalg.toeplitz(3), ValueError, r"qx\.linalg\.toeplitz: c: one dimension")):
+            with unittest.mock.patch.object(axes, "processors", lambda: 2), self.assertRaisesRegex(kind, text):
+                call()
+        with self.assertRaisesRegex(ValueError, r"^ReOXFFTH: "):
+            qx.exports.ReOXFFTH([])
 
     def test_every_key_of_the_table_belongs_to_a_function(self):
         for topic, keys in newest.NEWEST.items():

@@ -8,6 +8,7 @@ side while the exports work.
 from __future__ import annotations
 
 import math
+import operator
 import os
 import threading
 from concurrent.futures import ThreadPoolExecutor
@@ -17,7 +18,7 @@ from typing import Any
 import numpy as np
 from numpy.typing import ArrayLike, NDArray
 
-from ..outcomes import keeping, warn
+from ..outcomes import QxError, at, keeping, named, warn
 
 Channel = Callable[[NDArray[Any]], Any]  # a function of one channel
 
@@ -76,7 +77,10 @@ def many(function: Callable[[Any], Any], channels: Sequence[Any] | NDArray[Any],
     """The results of the function for each of the channels, in order; `size` elements in all."""
     if len(channels) < 2 or size < ENOUGH or processors() < 2 or _workers.is_one():
         return [function(channel) for channel in channels]
-    done = list(_workers.get().map(lambda channel: keeping(function, channel), channels))
+    try:
+        done = list(_workers.get().map(lambda channel: keeping(function, channel), channels))
+    except (QxError, TypeError, ValueError) as error:
+        raise named(error) from None
     given = {(warning.export, warning.code): warning for _, kept in done for warning in kept}
     for warning in given.values():
         warn(warning)
@@ -92,7 +96,7 @@ def as_array(x: ArrayLike) -> NDArray[Any]:
     if type(x) is np.ndarray:
         return x
     if isinstance(x, np.ma.MaskedArray) and np.ma.is_masked(x):
-        raise ValueError(f"{np.ma.count_masked(x)} elements are masked: fill or compress the array")
+        raise ValueError(f"{at('x')}: {np.ma.count_masked(x)} elements are masked: fill or compress the array")
     return np.asarray(x)
 
 
@@ -119,9 +123,13 @@ def along(function: Channel, x: ArrayLike, axis: int = LAST) -> Any:
 
 def _check_axis(dimensions: int, axis: int) -> None:
     if not dimensions:
-        raise ValueError("an array of at least one dimension is needed; a single number came")
-    if not -dimensions <= axis < dimensions:
-        raise ValueError(f"axis {int(axis)} is none of an array of {dimensions} dimension{'s'[:dimensions - 1]}")
+        raise ValueError(f"{at('x')}: an array of at least one dimension is needed; a single value came")
+    try:
+        place = operator.index(axis)
+    except TypeError:
+        raise TypeError(f"{at('axis')}: a whole number is needed; {axis!r} came") from None
+    if not -dimensions <= place < dimensions:
+        raise ValueError(f"{at('axis')}: {place} is none of an array of {dimensions} dimension{'s'[:dimensions - 1]}")
 
 
 def _flat(x: NDArray[Any], axis: int) -> tuple[NDArray[Any], NDArray[Any]]:
@@ -129,7 +137,7 @@ def _flat(x: NDArray[Any], axis: int) -> tuple[NDArray[Any], NDArray[Any]]:
     moved = np.moveaxis(x, axis, -1)
     flat = moved.reshape(math.prod(moved.shape[:-1]), moved.shape[-1])
     if not len(flat):
-        raise ValueError(f"an array of shape {x.shape} has no channel along axis {int(axis)}")
+        raise ValueError(f"{at('x')}: an array of shape {x.shape} has no channel along axis {int(axis)}")
     return flat, moved
 
 

@@ -6,9 +6,11 @@ A key is the name of a topic's function or class, or begins with it and an under
 from __future__ import annotations
 
 import difflib
+import functools
 import importlib
+import sys
 from collections.abc import Iterable
-from typing import Any
+from typing import Any, NoReturn
 
 from ..calls import export, hint
 from ..library import library
@@ -219,7 +221,19 @@ class Served:
 
 
 def served(topic: str) -> Served:
+    """The exports of a topic. From then on its module answers wrong names; type checkers do not see that, who
+    would take every name for one of the module's then."""
+    module = sys.modules.get(f"{__package__.rpartition('.')[0]}.{topic}")
+    if module:
+        vars(module).setdefault("__getattr__", functools.partial(missing, module.__name__))
     return Served(topic)
+
+
+def missing(module: str, name: str) -> NoReturn:
+    """Answers a wrong name in the module of a topic."""
+    if name.startswith("_"):
+        raise AttributeError(f"module {module!r} has no attribute {name!r}")
+    raise AttributeError(f"{module} has no function {name}{answer(name, inner=module.rpartition('.')[2])}")
 
 
 def function_of(topic: Any, key: str) -> Any:
@@ -240,9 +254,14 @@ def public_names() -> dict[str, list[str]]:
     return found
 
 
-def answer(name: str, more: Iterable[str] = ()) -> str:
-    """Where a name is that somebody looked for in another place, as the end of a message."""
+def answer(name: str, more: Iterable[str] = (), inner: str = "") -> str:
+    """Where a name is that somebody looked for in another place, as the end of a message; what is near it in
+    the topic `inner`, where that was the place, comes first."""
     places = public_names()
+    if inner and name not in places:
+        own = [known for known, topics in places.items() if inner in topics]
+        if near := hint(name, own):
+            return near
     lower = {known.lower(): known for known in places}
     known = lower.get(name.lower())
     if known is None and name not in library().entries:

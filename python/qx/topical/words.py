@@ -3,12 +3,16 @@
 from __future__ import annotations
 
 import difflib
+import math
 import operator
 from collections.abc import Mapping
 from typing import Any, NoReturn
 
 from ..library import library
 from ..outcomes import kind_of
+
+
+MOST = 1 << 64  # no count, order or seed is above
 
 
 def refuse(function: str, argument: str, rule: str, name: str = "ErrInvalidSelector") -> NoReturn:
@@ -30,6 +34,17 @@ def chosen(function: str, argument: str, value: Any, words: Mapping[Any, Any]) -
         f"; did you mean {word!r}?" for word in near))
 
 
+def positive(function: str, argument: str, value: Any, name: str = "ErrNotStrictlyPositive") -> float:
+    """A finite float above 0."""
+    try:
+        number = float(value)
+    except (TypeError, ValueError):
+        raise TypeError(f"qx.{function}: {argument}: a number is needed; {value!r} came") from None
+    if not 0 < number < math.inf:
+        refuse(function, argument, f"must be above 0 and finite; {value} came", name)
+    return number
+
+
 def whole_number(function: str, argument: str, value: Any, least: int | None = None,
                  name: str = "ErrCountNotPositive") -> int:
     """An int of at least `least`."""
@@ -39,6 +54,8 @@ def whole_number(function: str, argument: str, value: Any, least: int | None = N
         if not (isinstance(value, float) and value.is_integer()):
             raise TypeError(f"qx.{function}: {argument}: a whole number is needed; {value!r} came") from None
         number = int(value)
+    if abs(number) > MOST:
+        refuse(function, argument, f"{value} is too large", name)
     if least is not None and number < least:
         refuse(function, argument, f"must be at least {least}; {number} came", name)
     return number
