@@ -163,7 +163,7 @@ constexpr Message messages[] = {
     QX_MESSAGE(ErrMeasureRangeReversed, "The lower end of a range must be below its upper end."),
     QX_MESSAGE(ErrMeasureLevelsReversed,
                "The low reference level must be below the high reference level."),
-    QX_MESSAGE(ErrMeasureTooManyChannels, "The measurement takes at most 2 channels."),
+    QX_MESSAGE(ErrMeasureTooManyChannels, "The method of the measurement is unknown, or there are more than 2 channels."),
     QX_MESSAGE(ErrMeasureEmptyChannel, "A channel has no samples."),
     QX_MESSAGE(ErrMeasureNotFound, "The waveform does not have what is to be measured."),
     QX_MESSAGE(ErrMeasureBadCount, "The number of tones or peaks must be at least 1."),

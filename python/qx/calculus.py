@@ -11,7 +11,7 @@ import numpy as np
 from numpy.typing import ArrayLike
 
 from . import windows
-from .topical import LAST, Result, along, chosen, refuse, result, served, whole_number
+from .topical import LAST, Result, along, chosen, procedure, refuse, result, served, whole_number
 from .topical.axes import as_array
 
 __all__ = ["Quadrature", "cumulative", "derivative", "displacement", "integrate", "integrate2",
@@ -399,6 +399,7 @@ def quad(f: Callable[..., Any], a: float, b: float, tolerance: float = 1e-10, li
     """
     if math.isnan(a) or math.isnan(b):
         refuse("calculus.quad", "a, b", "an end is NaN", "ErrNaNInData")
+    procedure("calculus.quad", "f", f)
     limit = whole_number("calculus.quad", "limit", limit, 1)
     if math.isinf(a) or math.isinf(b):
         return _quad_infinite(f, a, b, tolerance, limit)

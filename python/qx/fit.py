@@ -22,7 +22,7 @@ import numpy as np
 from numpy.typing import ArrayLike, NDArray
 
 from .outcomes import QxError, QxWarning, warn
-from .topical import Result, chosen, refuse, result, served, vector, whole_number
+from .topical import Result, chosen, procedure, refuse, result, served, vector, whole_number
 
 __all__ = ["BSpline", "Fit", "SmoothingSpline", "curve", "exponential", "gaussian", "line", "linear",
            "logarithm", "nonlinear", "polynomial", "power"]
@@ -801,6 +801,7 @@ def curve(f: Callable[..., Any], x: ArrayLike, y: ArrayLike, guess: dict[str, An
     >>> {name: round(value, 6) for name, value in fit.parameters.items()}
     {'amplitude': 2.0, 'rate': 3.0}
     """
+    procedure("fit.curve", "f", f)
     names = [*inspect.signature(f).parameters][1:]
     given = guess if isinstance(guess, dict) else [*guess]
     start = given if isinstance(given, dict) else dict(zip(names, given))
@@ -858,6 +859,7 @@ def nonlinear(f: Callable[..., Any], x: ArrayLike, y: ArrayLike, guess: Sequence
     >>> {name: round(value, 6) for name, value in fit.parameters.items()}
     {'p0': 2.0, 'p1': 3.0}
     """
+    procedure("fit.nonlinear", "f", f)
     start = [float(one) for one in guess]
     names = [f"p{j}" for j in range(len(start))] if names is None else list(names)
     if len(names) != len(start) or len(set(names)) < len(names):

@@ -142,6 +142,17 @@ def _enumeration_text(name, one):
     return "\n".join(lines + [_filled(f"{number} {text}", "    ") for number, text in one["values"]])
 
 
+def values_of(argument):
+    """What a selector may be, with a text for each: that of its enumeration, where the header names one."""
+    values = dict(argument.get("values", ()))
+    for text in set(values.values()):
+        named = re.fullmatch(r"those of (\w+)", text)
+        if named and named[1] in library().catalogue["enumerations"]:
+            texts = dict(library().catalogue["enumerations"][named[1]]["values"])
+            values = {value: texts.get(value, text) for value in values}
+    return values
+
+
 class Writer:
     """The source of one function and the names that it uses, which begin with an underscore."""
 
@@ -188,7 +199,7 @@ class Writer:
     def _number(self, argument):
         """Holds a real or whole number to its limits; the usual one without a call."""
         name, element, place = python_name(argument), argument["element"], self._place(argument)
-        if values := dict(argument.get("values", ())):
+        if values := values_of(argument):
             held = f"_values_of_{name}"
             first, last = min(values), max(values)
             known = f"{first} <= {name} <= {last}" if len(values) == last - first + 1 else f"{name} in {held}"

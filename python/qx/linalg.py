@@ -1240,7 +1240,10 @@ def solve_banded(bands: tuple[int, int], ab: ArrayLike, b: ArrayLike) -> NDArray
     >>> qx.linalg.solve_banded((0, 1), [[0.0, 1.0], [1.0, 1.0]], [3.0, 2.0])
     array([1., 2.])
     """
-    below, above = bands
+    if np.shape(bands) != (2,):
+        refuse("linalg.solve_banded", "bands", f"two numbers are needed, of diagonals below and above; {bands!r} came",
+               "ErrSizesDisagree")
+    below, above = (whole_number("linalg.solve_banded", "bands", one, 0, "ErrNegativeCount") for one in bands)
     ab, b = _matrix("linalg.solve_banded", ab, argument="ab"), as_array(b)
     if b.ndim == 1:
         return _served("solve_banded", ab, b)(ab, b, below, above)

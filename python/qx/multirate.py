@@ -216,7 +216,8 @@ def respace(x: ArrayLike, spacing: float, start: float = 0.0, axis: int = LAST) 
     """
     name = "multirate.respace"
     if not 0 < spacing < 2**31 or not 0 <= start < math.inf:
-        refuse(name, "spacing, start", f"must be above 0 and below 2^31, and finite and at least 0; {spacing} and {start} came",
+        refuse(name, "spacing, start", "must be above 0 and below 2^31, and finite and at least 0; "
+               f"{spacing} and {start} came",
                "ErrSamplingNotPositive")
     kernel = _kernel()
     design = {"ratio": float(spacing), "mode": 0, "start": float(start), "proto": kernel, "oversample": OVERSAMPLE}

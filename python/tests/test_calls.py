@@ -452,8 +452,12 @@ class Selectors(unittest.TestCase):
                 (lambda: qx.Rxy80(x, x, 7, 0), "Rxy80: algorithm: 7 .* 0 direct summation; 1 transforms$"),
                 (lambda: qx.AllCosWinH(x, 12, 0), "1 Hanning; .*; 9 low sidelobe, five terms; 11 Blackman-N"),
                 (lambda: qx.BWCoefs90(9.0, 1.0, 2.0, 2, 4, 0), "type: 4 .*0 lowpass; .*; 3 bandstop"),
+                (lambda: qx.StateLevels(x, 0, 1, 9, 9, 0), "method: 9 .*; 1 minimum and maximum; 2 the histogram"),
                 (lambda: qx.NumerIntegration2D_2017_head(np.eye(9), x, 4), "0; 1; 2; 3$")):
             self.assertRaisesRegex(ValueError, reason, call)
+        hist = {"method": 9, "bins": 9}  # a field, which only the code refuses
+        with self.assertRaisesRegex(qx.QxError, "method of the measurement is unknown.*unknown method"):
+            qx.PulseMeasEx([0.0, 1, 1, 0, 1], 0, 1, 1, 1, 1, {"high": 90, "mid": 50, "low": 10, "percent": 1}, hist, 0)
         self.assertRaisesRegex(TypeError, "algorithm: a whole number is needed; 0.5", qx.Rxy80, x, x, 0.5, 0)
         np.testing.assert_allclose(qx.Rxy80(x, x, np.int64(1), 0.0), qx.Rxy80(x, x, 0, 0))
 

@@ -75,11 +75,17 @@ class Names(unittest.TestCase):
                 (lambda: qx.spectra.welch([1.0, 2.0], np.inf), ValueError, r"qx\.spectra\.welch: fs: must be above"),
                 (lambda: qx.signals.unwrap([1.0, 2.0], 0), ValueError, r"qx\.signals\.unwrap: period: must be above"),
                 (lambda: qx.multirate.low_pass(np.inf, 2), TypeError, r"qx\.multirate\.low_pass: up: a whole"),
-                (lambda: qx.multirate.resample([1.0], 1e300), ValueError, r"qx\.multirate\.low_pass: up, down: "),
+                (lambda: qx.multirate.resample([1.0], 1e300), ValueError, r"qx\.multirate\.resample: up: .* is too large"),
                 (lambda: qx.measure.band_frequencies(3, 25, np.inf), ValueError, "low, high: must be above 0, finite"),
                 (lambda: qx.measure.tone([1.0, 2.0], "fast"), TypeError, r"qx\.measure\.tone: fs: a number"),
                 (lambda: qx.multirate.respace([1.0], 1e308), ValueError, r"qx\.multirate\.respace: spacing, start: "),
                 (lambda: qx.fft.dzt([1.0], 0, 1e308), ValueError, r"qx\.fft\.dzt: size: .* is too large"),
+                (lambda: qx.fit.curve(3, [1.0], [1.0], [1]), TypeError, r"qx\.fit\.curve: f: a function is needed"),
+                (lambda: qx.fit.nonlinear("f", [1.0], [1.0], [1]), TypeError, r"nonlinear: f: a function is needed"),
+                (lambda: qx.calculus.quad(None, 0, 1), TypeError, r"qx\.calculus\.quad: f: a function is needed"),
+                (lambda: qx.linalg.solve_banded(1, column, [1.0]), ValueError, r"bands: two numbers are needed"),
+                (lambda: qx.linalg.solve_banded((0, -1), column, [1.0]), ValueError, r"bands: must be at least 0"),
+                (lambda: qx.measure.delay([], [1.0]), ValueError, r"qx\.measure\.delay: x, y: an array is empty"),
                 (lambda: qx.linalg.toeplitz(3), ValueError, r"qx\.linalg\.toeplitz: c: one dimension")):
             with unittest.mock.patch.object(axes, "processors", lambda: 2), self.assertRaisesRegex(kind, text):
                 call()

@@ -214,7 +214,7 @@ def along_pairs(function: Callable[[NDArray[Any], NDArray[Any]], float], x: Arra
         _check_axis(one.ndim, 0 if one.ndim == 1 else place)  # a single channel has one axis
     moved = [one if one.ndim == 1 else np.moveaxis(one, place, -1) for one, place in zip(arrays, places)]
     shape = np.broadcast_shapes(*(one.shape[:-1] for one in moved))
-    rows = [np.broadcast_to(one, (*shape, one.shape[-1])).reshape(-1, one.shape[-1]) for one in moved]
+    rows = [np.broadcast_to(one, (*shape, one.shape[-1])).reshape(math.prod(shape), one.shape[-1]) for one in moved]
     found = many(lambda pair: function(*pair), [*zip(*rows)], sum(row.size for row in rows))
     return np.array(found).reshape(shape) if shape else found[0]
 

@@ -45,6 +45,12 @@ def positive(function: str, argument: str, value: Any, name: str = "ErrNotStrict
     return number
 
 
+def procedure(function: str, argument: str, value: Any) -> None:
+    """Refuses what cannot be called."""
+    if not callable(value):
+        raise TypeError(f"qx.{function}: {argument}: a function is needed; {value!r} came")
+
+
 def whole_number(function: str, argument: str, value: Any, least: int | None = None,
                  name: str = "ErrCountNotPositive") -> int:
     """An int of at least `least`."""
