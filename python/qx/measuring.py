@@ -124,14 +124,14 @@ def peaks(values, threshold=None, width=5, valleys=False, prominence=None):
 
 EVENT_SECONDS = 0.1  # what lasts about so long, such as the steep part of a heart beat
 EVENT_SAMPLES = 36  # where the rate is not known
+BLOCK = 1 << 20  # samples of a file in memory at once
 STEPS = 6  # of the activity in that time
 QUIET = 1.5  # bursts stand so far above what lies between them; tones, noise and drifts reach 0.9
 REFRACTORY = 2.5  # events follow each other no faster, in its multiples
 
 
-def activity(values, step):
-    """The root mean square slope of the values around every `step`-th sample, by the largest slope."""
-    means = multirate.decimate(values, step, "average")
+def activity(means):
+    """The root mean square slope around every one of the means, by the largest slope."""
     slopes = calculus.derivative(means)
     power = signals.convolve((slopes / (np.abs(slopes).max() or 1.0))**2, np.full(STEPS, 1 / STEPS), method="direct")
     # A moving mean over an even number: half a step late.
@@ -148,15 +148,39 @@ def separated(places, strengths, apart):
     return np.array(kept)
 
 
+def _burst(rate):
+    """The samples of a burst, and how many of them become one mean."""
+    length = max(STEPS, round(EVENT_SECONDS * rate)) if rate else EVENT_SAMPLES
+    return length, length // STEPS
+
+
 def events(values, rate):
     """The places at which the values are farthest from their median within each of the repeated
     bursts of steep slope, such as the beats of an electrocardiogram; none where there are no three
     of them."""
-    length = max(STEPS, round(EVENT_SECONDS * rate)) if rate else EVENT_SAMPLES
-    step = length // STEPS
+    length, step = _burst(rate)
     if len(values) < 20 * step * STEPS:
         return np.zeros(0)
-    strength = activity(values, step)
+    return _events(multirate.decimate(values, step, "average"), length, step, lambda first, last: values[first:last])
+
+
+MOST_MEANS = 1 << 24  # in memory, of a whole recording
+
+
+def events_of_whole(whole, rate):
+    """The events of all samples of a file (wholes.Whole); None where its means are too many for the memory."""
+    length, step = _burst(rate)
+    if whole.count // step > MOST_MEANS:
+        return None
+    if whole.count < 20 * step * STEPS:
+        return np.zeros(0)
+    means = [multirate.decimate(part, step, "average") for part in whole.parts(step * (BLOCK // step))]
+    return _events(np.concatenate(means), length, step, lambda first, last: whole.part(first, last - first))
+
+
+def _events(means, length, step, part_of):
+    """The events of a signal of which means and parts are there."""
+    strength = activity(means)
     largest = np.sort(strength)[-(len(strength) // 10):]
     level = stats.median(largest) / 2
     if level <= QUIET * stats.median(strength):
@@ -166,7 +190,7 @@ def events(values, rate):
     found = []
     for centre in centres:
         first = max(0, round(centre) - length)
-        part = values[first:round(centre) + length + 1]
+        part = part_of(first, round(centre) + length + 1)
         away = np.abs(part - stats.median(part))
         found.append(first + int(np.argmax(away)))
     found = np.unique(np.array(found, float))

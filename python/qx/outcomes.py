@@ -5,6 +5,8 @@ import re
 import sys
 import threading
 import warnings
+from types import FrameType
+from typing import Optional
 
 from numpy.linalg import LinAlgError
 
@@ -73,7 +75,8 @@ def kind_of(name, code=0):
 
 def caller():
     """The public function of a topic that is at work, such as "fft.rfft"; empty for a call of an export."""
-    found, frame = "", sys._getframe(1)
+    found = ""
+    frame: Optional[FrameType] = sys._getframe(1)
     while frame and frame.f_code.co_filename.startswith((_PACKAGE, "<qx ")):
         module = frame.f_globals.get("__name__", "").removeprefix(_NAME)
         parts = getattr(frame.f_code, "co_qualname", frame.f_code.co_name).split(".")  # before Python 3.11 the last one

@@ -108,6 +108,8 @@ def cleaned(recording):
         text += "No hum of the mains stands out of the spectrum, so none is removed. "
     rows.append(Row("RMS of what is left", number(stats.rms(after), 6), unit, source + ", stats.rms"))
     used = highpass if bandstop is None else highpass * bandstop
+    if recording.whole:
+        text += f"Hum and wander are those of the {len(values)} samples in memory. "
     return Section("Without hum and wander", text + "The filters run forward and backward over a signal that is "
                    "continued at its ends, so that nothing is delayed.", rows,
                    [traces(recording, after, wander), response(rate, used)])

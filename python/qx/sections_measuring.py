@@ -71,16 +71,28 @@ def pulse_rows(recording, pulse):
                 "measure.pulses")]
 
 
+def places_of(recording):
+    """The events of all samples, or of those in memory where that is not possible, and what is said of them."""
+    whole = recording.whole
+    places = measuring.events_of_whole(whole, recording.rate) if whole else None
+    if places is not None:
+        return places, f" Events of all {whole.count} samples; the plots show those in memory."
+    return (measuring.events(recording.values, recording.rate),
+            " Events of the samples in memory, since there are too many." if whole else "")
+
+
 def events(recording):
-    places = measuring.events(recording.values, recording.rate)
+    places, of = places_of(recording)
     if len(places) < 3:
         return None
+    rows = interval_rows(recording, places)
+    places = places[places < len(recording.values)]
     found = places.astype(int)
-    rows, figures = interval_rows(recording, places), [marked(recording, found)]
+    figures = [marked(recording, found)]
     one = measuring.typical_event(recording.values, places)
     if one:
         rows += pulse_rows(recording, one[0])
         figures.append(measured(recording, *one))
     return Section("Repeated events", "Where bursts of steep slope stand out, such as the beats "
                    "of an electrocardiogram; each is placed at the sample that is farthest from "
-                   "the median around it.", rows, figures)
+                   "the median around it." + of, rows, figures)

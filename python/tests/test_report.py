@@ -20,9 +20,10 @@ PYTHON = Path(__file__).resolve().parent.parent
 sys.path.insert(0, str(PYTHON))
 import qx  # noqa: E402
 from qx import __main__ as command  # noqa: E402
-from qx import audio, isolation, pages, recording, report, sections, sections_recording  # noqa: E402
-from qx import sections_spectra, tables, wholes  # noqa: E402
+from qx import audio, isolation, measuring, pages, recording, report, sections, sections_measuring  # noqa: E402
+from qx import sections_recording, sections_spectra, tables, wholes  # noqa: E402
 
+HERE = mock.patch.object(isolation, "AVAILABLE", False)  # files are read in this process, with what is put into it
 ECG = PYTHON.parent / "examples/data/ecg_208_360hz.csv"
 
 
@@ -163,7 +164,7 @@ class Reading(InFolder):
         lines = [f"{i};{i % 7}" for i in range(1000)]
         lines[700] = "# a comment"
         text = "t;u\n" + "\n".join(lines)
-        with mock.patch.object(isolation, "AVAILABLE", False), mock.patch.object(tables, "LINES_AT_ONCE", 97):
+        with HERE, mock.patch.object(tables, "LINES_AT_ONCE", 97):
             read = self.read(text)
             self.assertEqual(read.values.tolist(), [i % 7 for i in range(1000) if i != 700])
             self.assertRaisesRegex(recording.InputError, ":902: column 2, u: 'x' is not a number", self.read,
@@ -226,7 +227,8 @@ class Reading(InFolder):
         filled = np.interp(np.arange(999), np.flatnonzero(~gaps), x[~gaps])
         for kept in (200, 2000):
             for lines in (10, 301, 2000):
-                with mock.patch.object(recording, "MOST_SAMPLES", kept), mock.patch.object(tables, "LINES_AT_ONCE", lines):
+                with HERE, mock.patch.object(recording, "MOST_SAMPLES", kept), mock.patch.object(
+                        tables, "LINES_AT_ONCE", lines):
                     for missing, values, outline in (("skip", x[~gaps], np.where(gaps, np.nan, x)),
                                                      ("interpolate", filled, filled)):
                         read = self.read(text, missing=missing)
@@ -246,8 +248,10 @@ class Reading(InFolder):
                      sections_spectra.power, sections_spectra.over_time]
         with mock.patch.object(report, "SECTIONS", sections_), mock.patch.object(sections_spectra, "LONGEST", 1024):
             expected = report.sections_of(recording.read(self.folder / "a.wav"))
-            with mock.patch.object(recording, "MOST_SAMPLES", 7000), mock.patch.object(wholes, "BLOCK", 4001):
-                found = report.sections_of(recording.read(self.folder / "a.wav"))
+            with HERE, mock.patch.object(recording, "MOST_SAMPLES", 7000), mock.patch.object(wholes, "BLOCK", 4001):
+                read = recording.read(self.folder / "a.wav")
+                self.assertEqual((len(read.values), read.whole.count), (7000, 30_000))
+                found = report.sections_of(read)
         for one, other in zip(found, expected, strict=True):
             self.assertEqual([(row.label, row.value) for row in one.rows if "Mode" not in row.label],
                              [(row.label, row.value) for row in other.rows if "Mode" not in row.label])
@@ -255,6 +259,25 @@ class Reading(InFolder):
                              other.text.split(" samples")[0] if one is found[0] else other.title)
             for plot, alike in zip(one.figures, other.figures):
                 self.assertEqual(plot.x_label, alike.x_label)
+
+    def test_events_of_a_long_file_are_those_of_all_its_samples(self):
+        t = np.arange(40_000) / 1000
+        beats = sum(np.exp(-((t - place) / 0.01) ** 2) for place in np.arange(0.5, 40, 0.8))
+        x = beats + 0.01 * np.random.default_rng(5).normal(size=len(t))
+        soundfile.write(self.folder / "a.wav", x / 2, 1000, "DOUBLE")
+        expected = sections_measuring.events(recording.read(self.folder / "a.wav"))
+        with HERE, mock.patch.object(recording, "MOST_SAMPLES", 7000), mock.patch.object(measuring, "BLOCK", 4001):
+            read = recording.read(self.folder / "a.wav")
+            np.testing.assert_array_equal(sections_measuring.places_of(read)[0], measuring.events(x / 2, 1000))
+            found = sections_measuring.events(read)
+            self.assertIn("Events of all 40000 samples", found.text)
+            count = len(sections_measuring.interval_rows(read, np.arange(3.0)))
+            self.assertEqual([(row.label, row.value) for row in found.rows[:count]],
+                             [(row.label, row.value) for row in expected.rows[:count]])
+            self.assertEqual(found.rows[0].value, "50")
+            self.assertLess(max(mark.x for mark in found.figures[0].marks), 7)
+            with mock.patch.object(measuring, "MOST_MEANS", 100):
+                self.assertIn("of the samples in memory", sections_measuring.events(read).text)
 
     def test_all_channels_are_there(self):
         read = self.read("time,a [V],word,b\n0,1,x,5\n1,2,y,\n2,3,z,7\n")

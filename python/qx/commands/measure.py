@@ -78,12 +78,14 @@ def tell(options, names, rows):
 
 
 def peaks(options):
-    from .. import measuring
+    from .. import measuring, sections_measuring
     read, step = opened(options)
     time, value = f"time ({read.time_unit})", read.unit or "value"
     if options.events:
-        places = measuring.events(read.values, read.rate)
-        rows = [(place * step, read.values[int(place)]) for place in places]
+        places, _ = sections_measuring.places_of(read)
+        values = [float(read.whole.part(int(place), 1)[0]) for place in places] if read.whole else \
+            read.values[places.astype(int)]
+        rows = [(place * step, value) for place, value in zip(places, values)]
         names = [time, value]
         print(f"{read.name}: {len(rows)} events")
     else:
