@@ -23,7 +23,7 @@ INSTEAD = {
                "lu_solve_complex": "CxLULinEqs_head", "inv": "InvMatrixLUDri_head", "inv_complex": "CxInvMatrixLUDri_head",
                "solve_inverse": None, "solve_inverse_complex": None},
     "filters": {"zero_phase": "zeroPhaseCascadeFiltH", "Filter_roots": None, "Filter_roots_complex": None,
-                "Filter_polynomial": None, "windowed_window": None},
+                "Filter_polynomial": None},
     "windows": {"get": None},
     "spectra": {"welch": None, "welch_sized": None, "welch_complex": None, "welch_complex_sized": None,
                 "welch_power": None, "analytic": None, "instantaneous_phase": None},
