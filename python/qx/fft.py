@@ -312,7 +312,7 @@ def fftfreq(n: int, d: float = 1.0) -> NDArray[np.float64]:
     Raises
     ------
     ValueError
-        If n is below 1.
+        If n is below 1, or d is not above 0.
 
     Examples
     --------
@@ -341,7 +341,7 @@ def rfftfreq(n: int, d: float = 1.0) -> NDArray[np.float64]:
     Raises
     ------
     ValueError
-        If n is below 1.
+        If n is below 1, or d is not above 0.
 
     Examples
     --------

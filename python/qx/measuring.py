@@ -174,7 +174,7 @@ def events_of_whole(whole, rate):
         return None
     if whole.count < 20 * step * STEPS:
         return np.zeros(0)
-    means = [multirate.decimate(part, step, "average") for part in whole.parts(step * (BLOCK // step))]
+    means = [multirate.decimate(part, step, "average") for part in whole.parts(step * max(1, BLOCK // step))]
     return _events(np.concatenate(means), length, step, lambda first, last: whole.part(first, last - first))
 
 

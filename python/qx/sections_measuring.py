@@ -89,7 +89,7 @@ def events(recording):
     places = places[places < len(recording.values)]
     found = places.astype(int)
     figures = [marked(recording, found)]
-    one = measuring.typical_event(recording.values, places)
+    one = measuring.typical_event(recording.values, places) if len(places) else None
     if one:
         rows += pulse_rows(recording, one[0])
         figures.append(measured(recording, *one))

@@ -276,6 +276,9 @@ class Reading(InFolder):
                              [(row.label, row.value) for row in expected.rows[:count]])
             self.assertEqual(found.rows[0].value, "50")
             self.assertLess(max(mark.x for mark in found.figures[0].marks), 7)
+            at_the_end = np.array([30_000.0, 31_000, 32_000])
+            with mock.patch.object(measuring, "events_of_whole", lambda *_: at_the_end):
+                self.assertEqual(sections_measuring.events(read).figures[0].marks, [])
             with mock.patch.object(measuring, "MOST_MEANS", 100):
                 self.assertIn("of the samples in memory", sections_measuring.events(read).text)
 
