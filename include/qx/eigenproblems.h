@@ -36,6 +36,28 @@ QX_API int32_t CxEigenValueVector_head(QX_IN CDB2D a, QX_IN const int32_t *matri
                                        QX_IN const int32_t *output, QX_OUT CDB1D values,
                                        QX_OUT CDB2D vectors, QX_OUT ErrorCode *err);
 
+/** As EigenValueVector_head, by blocks from order 128 on, which is several times as fast at order 500:
+    reduction to Hessenberg form by blocks of reflections, iterations with many shifts and early
+    deflation (K. Braman, R. Byers and R. Mathias, "The multishift QR algorithm", 2002), and vectors by
+    products of matrices, of which the largest element of a complex one is real. Below that with the
+    bits of EigenValueVector_head.
+    Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory),
+    ErrInvalidSelector (*output is not 0 or 1), ErrNonFiniteInput (an element is not finite),
+    ErrIterationLimit (30 iterations for each value, or 40 below order 128, were not enough).
+    NaN: a refused with ErrNonFiniteInput. */
+QX_API int32_t EigenValueVector2026_head(QX_IN DBL2D a, QX_IN const int32_t *output,
+                                         QX_OUT CDB1D values, QX_OUT CDB2D vectors,
+                                         QX_OUT ErrorCode *err);
+/** As CxEigenValueVector_head, for general matrices by blocks from order 128 on as
+    EigenValueVector2026_head; Hermitian ones have the bits of CxEigenValueVector_head.
+    Codes: ErrNotSquare (a is not square), ErrEmptyInput (a is empty), ErrOutOfMemory (no memory),
+    ErrInvalidSelector (*matrixType or *output is not 0 or 1), ErrNonFiniteInput (an element is not
+    finite), ErrIterationLimit (30 iterations for each value, 40 below order 128, or 100 if
+    Hermitian were not enough). */
+QX_API int32_t CxEigenValueVector2026_head(QX_IN CDB2D a, QX_IN const int32_t *matrixType,
+                                           QX_IN const int32_t *output, QX_OUT CDB1D values,
+                                           QX_OUT CDB2D vectors, QX_OUT ErrorCode *err);
+
 /** Eigenvalues, ascending, of the symmetric matrix whose lower triangle a holds. output: 0 a stays;
    1 a becomes the matrix of orthonormal eigenvectors, one in each column. Householder reduction and
    implicit QL iteration. The error of a value is a few n eps times the largest one. Codes:

@@ -131,6 +131,15 @@ QX_API ErrorCode QRDecH(QX_IN DBL2D a, int32_t pivoting, int32_t economy, QX_OUT
 QX_API ErrorCode CxQRDecH(QX_IN CDB2D a, int32_t pivoting, int32_t economy,
                           QX_OUT I32_2D permutation, QX_OUT CDB2D q, QX_OUT CDB2D r);
 
+/** As QRDecH, by blocks of reflections where min(m, n) is at least 128 (R. Schreiber and C. F. Van
+    Loan, "A storage-efficient WY representation for products of Householder transformations", 1989),
+    which is several times as fast from order 500 on; below that with the bits of QRDecH. */
+QX_API ErrorCode QRDec2026H(QX_IN DBL2D a, int32_t pivoting, int32_t economy,
+                            QX_OUT I32_2D permutation, QX_OUT DBL2D q, QX_OUT DBL2D r);
+/** As QRDec2026H, for complex elements; the diagonal of r is real. */
+QX_API ErrorCode CxQRDec2026H(QX_IN CDB2D a, int32_t pivoting, int32_t economy,
+                              QX_OUT I32_2D permutation, QX_OUT CDB2D q, QX_OUT CDB2D r);
+
 /** Singular value decomposition a = u diag(s) v^T of the m by n matrix a, k = min(m, n): a becomes
     u of m by k, s has k falling values, and v is n by k. G. H. Golub and C. Reinsch, "Singular
     value decomposition and least squares solutions", 1970. For norms from 1 on, u diag(s) v^T is
