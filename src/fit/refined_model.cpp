@@ -224,13 +224,14 @@ double Largest(ConstRealVector x) {
     return largest;
 }
 
-// Whether a step that is `rate` times this one changes no digit of a rounded coefficient.
-bool IsSettled(const PairVector &c, ConstRealVector step, double rate, double size) {
-    for (std::ptrdiff_t j = 0; j < step.size(); ++j) {
-        const double next = std::fabs(step[j]) * rate;
-        if (next > 0x1p-57 * std::fabs(c.high[j]) && next > 0x1p-90 * size)
+// Whether a step that is `rate` times this one changes no digit that counts: of a rounded
+// coefficient, or of a pair where pairs are wanted.
+bool IsSettled(const PairVector &c, ConstRealVector step, double rate, bool inPairs) {
+    const double least = Largest(c.high) * (inPairs ? 0x1p-106 : 0x1p-90);
+    const double relative = inPairs ? 0.0 : 0x1p-57;
+    for (std::ptrdiff_t j = 0; j < step.size(); ++j)
+        if (std::fabs(step[j]) * rate > std::max(relative * std::fabs(c.high[j]), least))
             return false;
-    }
     return true;
 }
 
@@ -264,7 +265,7 @@ ErrorCode Improve(const PairModel &model, const Values &values, const PairVector
             break;
         for (int32_t j = 0; j < model.k; ++j)
             c.set(j, PairSum(c.at(j), {step[j], 0.0}));
-        if (size == 0.0 || IsSettled(c, step, size / last, Largest(c.high)))
+        if (size == 0.0 || IsSettled(c, step, size / last, model.rows.hasLow()))
             break;
         last = size;
     }

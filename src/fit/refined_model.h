@@ -25,7 +25,7 @@ struct PairBlock {
 class PairRows {
 public:
     virtual void write(const PairBlock &block) const = 0;
-    // Whether low parts may be other than 0.
+    // Whether low parts may be other than 0; then coefficients are wanted in pairs, too.
     virtual bool hasLow() const = 0;
 
 protected:

@@ -127,7 +127,7 @@ Tails FewFisherTails(double f, double n, double d) {
         std::log(few) + (isFirst ? std::log(f) : -std::log(f)) - std::log(many);
     if (logarithm < -650.0) { // the incomplete beta integral from 0 to its first term
         const double integral = -logarithm - Digamma(0.5 * many) - kEuler;
-        return {{0.5 * few * integral, Whole(0.0)}, !isFirst, {0.5 * few, Whole(0.0)}};
+        return {{few * (0.5 * integral), Whole(0.0)}, !isFirst, {0.5 * few, Whole(0.0)}};
     }
     Tails tails = BetaTails(0.5 * (isFirst ? kFewDegrees : n), 0.5 * (isFirst ? d : kFewDegrees),
                             FisherShare(f, n, d));
@@ -273,8 +273,8 @@ double StudentValue(double t, double dof, DistributionValue what) {
 }
 
 double FisherValue(double f, double n, double d, DistributionValue what) {
-    n = Limited(n);
-    d = Limited(d);
+    n = std::min(n, kMostDegrees);
+    d = std::min(d, kMostDegrees);
     if (f == 0.0 && what == DistributionValue::Density)
         return DensityAtZero(n, 1.0);
     if (f <= 0.0 || std::isinf(f))
@@ -339,8 +339,8 @@ double FisherPoint(double p, bool isUpper, double n, double d) {
     double end;
     if (IsAtEnd(p, isUpper, 0.0, &end))
         return end;
-    n = Limited(n);
-    d = Limited(d);
+    n = std::min(n, kMostDegrees);
+    d = std::min(d, kMostDegrees);
     TakeSmaller(p, isUpper);
     const double z = UpperNormalPoint(p);
     const double spread = std::min(std::sqrt(2.0 / n + 2.0 / d), 50.0);

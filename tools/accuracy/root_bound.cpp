@@ -1,8 +1,9 @@
-// root_bound COUNT [SEED]: the residuals of COUNT polynomials' roots, in 113 bits.
+// root_bound COUNT [SEED]: the residuals of COUNT polynomials' roots, in 113 bits. SIGTERM ends it
+// early, with what is done. Built and run as
 //
-//     g++ -std=gnu++20 -O2 -Iinclude -Ibuild/release/include tools/accuracy/root_bound.cpp \
-//         -Lbuild/release -lqxanalysis -lqxrt -Wl,-rpath,$PWD/build/release -o /tmp/root_bound
-//     nice -n 19 /tmp/root_bound 100000
+//     g++ -std=gnu++20 -O2 -Iinclude -Ibuild/release/include tools/accuracy/root_bound.cpp
+//         -Lbuild/release -lqxanalysis -lqxrt -Wl,-rpath,$PWD/build/release -o root_bound
+//     nice -n 19 ./root_bound 100000
 //
 // Degrees are even over 1 to 200. Moduli of the coefficients are in turn 10^u with u even over -100
 // to 100, normal, and normal times 10^(u/20); half of the polynomials are complex. Prints the largest
@@ -15,6 +16,7 @@
 #include <algorithm>
 #include <chrono>
 #include <cmath>
+#include <csignal>
 #include <cstdio>
 #include <cstdlib>
 #include <cstdint>
@@ -59,6 +61,8 @@ struct Kind {
     long polynomials = 0, roots = 0, above = 0, codes = 0, missing = 0;
 };
 
+volatile std::sig_atomic_t isEnded = 0;
+
 } // namespace
 
 int main(int argc, char **argv) {
@@ -68,7 +72,8 @@ int main(int argc, char **argv) {
     std::uniform_real_distribution<double> decades(-100, 100);
     Kind kinds[] = {{"real, 10^u"}, {"real, normal"}, {"real, both"}, {"complex, 10^u"},
                     {"complex, normal"}, {"complex, both"}};
-    for (long i = 0; i < count; ++i) {
+    std::signal(SIGTERM, [](int) { isEnded = 1; });
+    for (long i = 0; i < count && isEnded == 0; ++i) {
         Kind &kind = kinds[i % 6];
         const bool isComplex = i % 6 > 2;
         const int n = 1 + static_cast<int>(random() % 200);

@@ -148,6 +148,7 @@ NEWEST = {
     },
     "special": {
         "gamma": "QX_Gamma_85", "gammaln": "QX_LnGamma", "gammainc": "QX_Gamma_85",
+        "gammainc_large": "ChiSquare2026_head", "gammaincc_large": "ChiSquare2026_head",
         "gammaincc": "QX_GammaC", "beta": "QX_Beta_85", "betainc": "QX_Beta_85",
         "factorial": "QX_Fact", "factorialln": "QX_LnFact", "digamma": "QX_Psi",
         "zeta": "QX_Zeta", "stirling": "QX_Stirling", "erf": "QX_Erf", "erfc": "QX_ErfC",

@@ -31,7 +31,7 @@ ErrorCode EigenGeneral(const ConstComplexMatrix &a, ComplexVector values,
 // The same by blocks from order fewestBlockedEigen on: reduction to Hessenberg form by blocks of
 // reflections, iterations with many shifts and early deflation (K. Braman, R. Byers and R. Mathias,
 // "The multishift QR algorithm", 2002), and vectors by products of matrices.
-constexpr int32_t fewestBlockedEigen = 128;
+constexpr int32_t fewestBlockedEigen = 160;
 template <ElementType E>
 ErrorCode EigenBlocked(const ConstMatrixView<E> &a, ComplexVector values,
                        const ComplexMatrix &vectors);

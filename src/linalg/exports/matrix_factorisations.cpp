@@ -166,7 +166,7 @@ Outcome QR(In<Matrix> a, bool pivoting, int32_t form, Out<I32_2D> permutation, O
     ScratchParts memory;
     if (const ErrorCode failed = memory.take(Sized(pivots, n)))
         return failed;
-    constexpr auto &decompose = isBlocked ? QRDecomposeBlocked<E> : QRDecomposePivoted<E>;
+    const auto decompose = isBlocked ? QRDecomposeBlocked<E> : QRDecomposePivoted<E>;
     if (const ErrorCode failed = decompose(a.view(), QRForm{form}, pivots, q.view(), r.view()))
         return failed;
     WritePermutation(pivots, permutation.view());

@@ -27,7 +27,7 @@ ErrorCode QRDecomposePivoted(const ConstMatrixView<E> &a, QRForm form, IndexVect
 // representation for products of Householder transformations", 1989) where min(m, n) is at least
 // fewestBlocked, and as above below it. Pivots may be empty, then columns keep their order. What
 // overflows is infinite or NaN.
-constexpr int32_t fewestBlocked = 128;
+constexpr int32_t fewestBlocked = 160;
 template <ElementType E>
 ErrorCode QRDecomposeBlocked(const ConstMatrixView<E> &a, QRForm form, IndexVector pivots,
                              const MatrixView<E> &q, const MatrixView<E> &r);

@@ -209,7 +209,7 @@ void ExpectBlockedQR(const Elements &a, int m, int n, qx::QRForm form, bool pivo
 }
 
 TEST(QRDecomposition, BlocksFactorLargeMatrices) {
-    for (const auto &sizes : {std::pair(150, 131), std::pair(128, 140)})
+    for (const auto &sizes : {std::pair(170, 161), std::pair(160, 175)})
         for (const bool pivoting : {false, true})
             for (const qx::QRForm form : {qx::qrFull, qx::qrEconomical}) {
                 SCOPED_TRACE(testing::Message() << sizes.first << pivoting << form);
