@@ -184,8 +184,8 @@ void QR(Method method) {
             ratios, isRevision ? "qr, revision" : "qr", n,
             [&] {
                 if (isRevision)
-                    qx::QRDecomposeBlocked<Real>({a.data(), n, n}, qx::qrFull, {},
-                                                 {q.data(), n, n}, {r.data(), n, n});
+                    qx::QRDecomposeBlocked<Real>({a.data(), n, n}, qx::qrFull, {}, {q.data(), n, n},
+                                                 {r.data(), n, n});
                 else
                     qx::QRDecompose<Real>({a.data(), n, n}, qx::qrFull, {q.data(), n, n},
                                           {r.data(), n, n});

@@ -260,8 +260,8 @@ ErrorCode FitGeneralRefined(const ConstRealMatrix &h, const FitSamples &samples,
         c[j] = std::ldexp(found.high[j], scaled.yExponent - exponents[j]);
     for (int32_t i = 0; i < covariance.rows(); ++i)
         for (int32_t j = 0; j < k; ++j)
-            covariance(i, j) = std::ldexp(covariance(i, j),
-                                          -scaled.wExponent - exponents[i] - exponents[j]);
+            covariance(i, j) =
+                std::ldexp(covariance(i, j), -scaled.wExponent - exponents[i] - exponents[j]);
     const ErrorCode failed = Evaluate(model, found, scaled, out);
     return failed != 0 ? failed : status;
 }

@@ -70,8 +70,7 @@ public:
     template <bool withLow>
     void add(const PairBlock &block, int32_t j, int32_t from, int32_t count, const Residuals &r) {
         const DBL *const h = block.high.column(j) + from;
-        const DBL *const hLow =
-            withLow ? block.low + Residuals::column(block, j) + from : h;
+        const DBL *const hLow = withLow ? block.low + Residuals::column(block, j) + from : h;
         double high[sums], low[sums];
         for (int32_t s = 0; s < sums; ++s) {
             high[s] = high_(j, s);
@@ -118,7 +117,8 @@ public:
     template <class Visit>
     ErrorCode run(const PairVector &c, const Visit &visit) {
         const int32_t columns = model_.k + 1;
-        const int32_t capacity = std::min(model_.n, std::max(chunk, 3072 / columns / chunk * chunk));
+        const int32_t capacity =
+            std::min(model_.n, std::max(chunk, 3072 / columns / chunk * chunk));
         Scratch<ElementType::DBL> high, low;
         if (const ErrorCode failed = high.allocate(int64_t{capacity} * columns))
             return failed;
@@ -168,8 +168,7 @@ struct Values {
         for (int32_t i = 0; i < k; ++i)
             for (int32_t j = 0; j < k; ++j)
                 r(i, j) = j < i ? 0.0 : triangle.row(i)[j];
-        if (const ErrorCode failed =
-                SVDecompose<ElementType::DBL>(r, u, s, v, SVDScaling::Always))
+        if (const ErrorCode failed = SVDecompose<ElementType::DBL>(r, u, s, v, SVDScaling::Always))
             return failed;
         const double cut = (tolerance >= 0.0 ? tolerance : eps) * model.n * s[0];
         while (rank < k && s[rank] > cut)

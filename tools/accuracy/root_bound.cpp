@@ -17,9 +17,9 @@
 #include <chrono>
 #include <cmath>
 #include <csignal>
+#include <cstdint>
 #include <cstdio>
 #include <cstdlib>
-#include <cstdint>
 #include <random>
 #include <vector>
 
@@ -70,8 +70,8 @@ int main(int argc, char **argv) {
     std::mt19937_64 random(argc > 2 ? std::strtoull(argv[2], nullptr, 10) : 1);
     std::normal_distribution<double> normal;
     std::uniform_real_distribution<double> decades(-100, 100);
-    Kind kinds[] = {{"real, 10^u"}, {"real, normal"}, {"real, both"}, {"complex, 10^u"},
-                    {"complex, normal"}, {"complex, both"}};
+    Kind kinds[] = {{"real, 10^u"},    {"real, normal"},    {"real, both"},
+                    {"complex, 10^u"}, {"complex, normal"}, {"complex, both"}};
     std::signal(SIGTERM, [](int) { isEnded = 1; });
     for (long i = 0; i < count && isEnded == 0; ++i) {
         Kind &kind = kinds[i % 6];
@@ -80,7 +80,7 @@ int main(int argc, char **argv) {
         std::vector<Complex> a(n + 1);
         for (Complex &c : a) {
             const double u = decades(random);
-            const double size = i % 3 == 0 ? std::pow(10.0, u)
+            const double size = i % 3 == 0   ? std::pow(10.0, u)
                                 : i % 3 == 1 ? 1.0
                                              : std::pow(10.0, u / 20);
             c = {normal(random), isComplex ? normal(random) : 0.0};
@@ -95,13 +95,14 @@ int main(int argc, char **argv) {
         void *given = isComplex ? static_cast<void *>(QXHostCopy1D(QXTypeCDB, n + 1, a.data()))
                                 : static_cast<void *>(QXHostCopy1D(QXTypeDBL, n + 1, real.data()));
         const auto start = std::chrono::steady_clock::now();
-        const ErrorCode code =
-            isComplex ? CxPolyRoots2026_head(static_cast<CDB1D>(given), roots, errors)
-                      : PolyRoots2026_head(static_cast<DBL1D>(given), roots, errors);
+        const ErrorCode code = isComplex
+                                   ? CxPolyRoots2026_head(static_cast<CDB1D>(given), roots, errors)
+                                   : PolyRoots2026_head(static_cast<DBL1D>(given), roots, errors);
         kind.seconds +=
             std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count();
         ++kind.polynomials;
-        const auto found = *reinterpret_cast<const int32_t *>(*reinterpret_cast<char *const *>(roots));
+        const auto found =
+            *reinterpret_cast<const int32_t *>(*reinterpret_cast<char *const *>(roots));
         kind.codes += code != 0;
         kind.missing += found != n;
         const auto *z = static_cast<const Complex *>(QXHostElements1D(roots));
@@ -115,8 +116,9 @@ int main(int argc, char **argv) {
             QXHostFree(block);
     }
     for (const Kind &kind : kinds)
-        std::printf("%-16s %7ld polynomials, %9ld roots: worst %.3g, above 1: %ld, codes: %ld, without "
-                    "all roots: %ld, %.3f ms each\n",
-                    kind.name, kind.polynomials, kind.roots, kind.worst, kind.above, kind.codes, kind.missing,
-                    1e3 * kind.seconds / static_cast<double>(kind.polynomials));
+        std::printf(
+            "%-16s %7ld polynomials, %9ld roots: worst %.3g, above 1: %ld, codes: %ld, without "
+            "all roots: %ld, %.3f ms each\n",
+            kind.name, kind.polynomials, kind.roots, kind.worst, kind.above, kind.codes,
+            kind.missing, 1e3 * kind.seconds / static_cast<double>(kind.polynomials));
 }

@@ -104,8 +104,8 @@ std::vector<Recipe> PolynomialRecipes() {
              c.mayBeEmpty(3);
              c.mayBeEmpty(4);
              return PolyFit2026_head(Times(c, 0), c.in<DBL>(1), 3, NoWeights(c, 2), -1.0,
-                                     c.in<I32>(3, 0), c.in<DBL>(4, 0), c.out<DBL>(0),
-                                     c.out<DBL>(1), c.scalar(0));
+                                     c.in<I32>(3, 0), c.in<DBL>(4, 0), c.out<DBL>(0), c.out<DBL>(1),
+                                     c.scalar(0));
          },
          None,
          {4, 8, 50, 1000}},

@@ -275,10 +275,10 @@ PolynomialFit FitPowersRefined(const Samples &x, const Samples &y, int32_t order
                                const Samples &values = {}) {
     const DBLArray fit, c;
     PolynomialFit result = {};
-    result.code = PolyFit2026_head(DBLArray(x).handle(), DBLArray(y).handle(), order,
-                                   DBLArray(w).handle(), -1.0, I32Array(orders).handle(),
-                                   DBLArray(values).handle(), fit.handle(), c.handle(),
-                                   &result.mse);
+    result.code =
+        PolyFit2026_head(DBLArray(x).handle(), DBLArray(y).handle(), order, DBLArray(w).handle(),
+                         -1.0, I32Array(orders).handle(), DBLArray(values).handle(), fit.handle(),
+                         c.handle(), &result.mse);
     result.c = c.values();
     result.fit = fit.values();
     return result;
@@ -287,8 +287,10 @@ PolynomialFit FitPowersRefined(const Samples &x, const Samples &y, int32_t order
 TEST(LinearFits, RevisionsKeepTheDigitsOfNISTsSets) {
     // What is certified is of the decimal data, of which Norris, Pontius and Wampler2 lose digits in
     // binary; so do the powers of Filip as a matrix.
-    const std::map<std::string, double> bounds = {{"Norris", 2e-14},  {"Pontius", 1e-13},
-                                                  {"Filip", 5e-8},    {"Longley", 5e-15},
+    const std::map<std::string, double> bounds = {{"Norris", 2e-14},
+                                                  {"Pontius", 1e-13},
+                                                  {"Filip", 5e-8},
+                                                  {"Longley", 5e-15},
                                                   {"Wampler2", 2e-13}};
     for (const auto &named : ReferenceSets()) {
         const ReferenceSet &set = named.second;
@@ -333,12 +335,13 @@ TEST(LinearFits, RevisionsSolveProblemsOfAnySize) {
             ASSERT_EQ(found.code, 0);
             for (std::size_t j = 0; j < exact.c.size(); ++j) {
                 const int size = j % 2 == 0 ? scales.first : scales.second;
-                EXPECT_LT(RelativeError(std::ldexp(found.c[j], size - scales.first / 9), exact.c[j]),
-                          1e-14);
-                EXPECT_LT(RelativeError(std::ldexp(found.covariance[j][j],
-                                                   2 * size + scales.second / 9),
-                                        exact.covariance[j][j]),
-                          1e-12);
+                EXPECT_LT(
+                    RelativeError(std::ldexp(found.c[j], size - scales.first / 9), exact.c[j]),
+                    1e-14);
+                EXPECT_LT(
+                    RelativeError(std::ldexp(found.covariance[j][j], 2 * size + scales.second / 9),
+                                  exact.covariance[j][j]),
+                    1e-12);
             }
         }
     }
@@ -371,7 +374,10 @@ TEST(LinearFits, RevisedPolynomialsAreExact) {
         const PolynomialFit found = FitPowersRefined(x, y, 5);
         EXPECT_EQ(found.code, 0);
         for (int j = 0; j < 6; ++j)
-            EXPECT_NEAR(found.c[j], truth[j], truth[j] == 0.0 ? 1e-20 : middle == 0.0 ? 1e-15 : 1e-13)
+            EXPECT_NEAR(found.c[j], truth[j],
+                        truth[j] == 0.0 ? 1e-20
+                        : middle == 0.0 ? 1e-15
+                                        : 1e-13)
                 << middle << " " << j;
         EXPECT_EQ(found.fit, y);
         const PolynomialFit fixed = FitPowersRefined(x, y, 5, y, {0, 2, 9, 2}, {3, 7, 1, 2});

@@ -23,8 +23,8 @@ Outcome Eigen(In<DBL2D> a, int32_t output, Out<CDB1D> values, Out<CDB2D> vectors
         return bad;
     if (IsNoOutput(output))
         return ErrInvalidSelector;
-    const auto solve = steps == Steps::Blocked ? EigenBlocked<ElementType::DBL>
-                                                    : EigenGeneral<ElementType::DBL>;
+    const auto solve =
+        steps == Steps::Blocked ? EigenBlocked<ElementType::DBL> : EigenGeneral<ElementType::DBL>;
     return solve(a.view(), values.view(), vectors.view());
 }
 
@@ -41,8 +41,8 @@ Outcome CxEigen(In<CDB2D> a, int32_t matrixType, int32_t output, Out<CDB1D> valu
         return ErrInvalidSelector;
     if (matrixType == hermitianMatrix)
         return EigenHermitian(a.view(), values.view(), vectors.view());
-    const auto solve = steps == Steps::Blocked ? EigenBlocked<ElementType::CDB>
-                                                    : EigenGeneral<ElementType::CDB>;
+    const auto solve =
+        steps == Steps::Blocked ? EigenBlocked<ElementType::CDB> : EigenGeneral<ElementType::CDB>;
     return solve(a.view(), values.view(), vectors.view());
 }
 

@@ -42,8 +42,7 @@ public:
         for (int32_t j = 0; j < q.cols(); ++j)
             for (int32_t i = 0; i < m_; ++i)
                 columns(j, i) = j < count() ? columns_(j, i) : ElementOf<E>{};
-        if (const int32_t info =
-                lapack::FormQ(m_, q.cols(), count(), columns.data(), tau_.data()))
+        if (const int32_t info = lapack::FormQ(m_, q.cols(), count(), columns.data(), tau_.data()))
             return lapack::CodeOf(info);
         CopyTransposed<E>(columns, q);
         return 0;

@@ -72,9 +72,9 @@ std::vector<Recipe> EigenproblemRecipes() {
             recipes.push_back(
                 {"CxEigenValueVector2026_head" + variant + ", type " + std::to_string(type),
                  [output, type](Call &c) {
-                     return CxEigenValueVector2026_head(
-                         c.in2D<CDB>(0, c.n, c.n), c.byReference(type), c.byReference(output),
-                         c.out<CDB>(0), c.out2D<CDB>(1), c.err());
+                     return CxEigenValueVector2026_head(c.in2D<CDB>(0, c.n, c.n),
+                                                        c.byReference(type), c.byReference(output),
+                                                        c.out<CDB>(0), c.out2D<CDB>(1), c.err());
                  },
                  None,
                  type == 0 ? std::vector<int32_t>{1, 3, 161} : std::vector<int32_t>{1, 3, 7}});

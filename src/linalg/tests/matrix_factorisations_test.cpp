@@ -222,9 +222,10 @@ TEST(QRDecomposition, BlocksFactorLargeMatrices) {
                     for (double &element : scaled)
                         element *= size;
                     std::vector<double> q(m * m), r(m * n), same(m * n);
-                    ASSERT_EQ(qx::QRDecomposeBlocked<qx::ElementType::DBL>(
-                                  View(real, m, n), qx::qrFull, {}, View(q, m, m), View(same, m, n)),
-                              0);
+                    ASSERT_EQ(
+                        qx::QRDecomposeBlocked<qx::ElementType::DBL>(
+                            View(real, m, n), qx::qrFull, {}, View(q, m, m), View(same, m, n)),
+                        0);
                     ASSERT_EQ(qx::QRDecomposeBlocked<qx::ElementType::DBL>(
                                   View(scaled, m, n), qx::qrFull, {}, View(q, m, m), View(r, m, n)),
                               0);
