@@ -251,7 +251,8 @@ of the same doubles.
 
 {table(["Significance", "ours", "R qf", "SciPy f.isf"], critical_rows())}
 
-**Contingency tables**: the statistic against exact fractions, p against 60 digits.
+**Contingency tables**: the statistic against exact fractions, p against 60 digits. The revision takes p of the
+rounded statistic, of which half an ulp counts as many times in a small p as half the statistic says.
 
 {table(["Table", "p", "Contingency_head: statistic", "p", "Contingency2026_head: statistic", "p",
         "SciPy: statistic", "p"], contingency_rows())}
