@@ -125,7 +125,7 @@ QX_API ErrorCode GenLSFit80_head(QX_IN DBL2D H, QX_IN DBL1D y, QX_IN DBL1D w, in
                                  int32_t wantCovariance, QX_OUT DBL1D coefficients,
                                  QX_OUT DBL1D fit, QX_OUT DBL2D covariance, QX_OUT double *mse);
 /** As GenLSFit80_head, with coefficients that are exact to nearly the last digit for H, y and weights
-    as they are given, where the condition number of H with columns of one length is below 1e14. A
+    as they are given, where the condition number of H with columns of one length is below 1e13. A
     solution by the singular values of SVD2026_head is improved by residuals and their products with
     H in pairs of doubles (A. Bjorck, "Stability analysis of the method of seminormal equations for
     linear least squares problems", 1987). Columns and y are scaled by powers of two first. Singular

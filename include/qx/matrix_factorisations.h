@@ -132,10 +132,10 @@ QX_API ErrorCode QRDecH(QX_IN DBL2D a, int32_t pivoting, int32_t economy, QX_OUT
 QX_API ErrorCode CxQRDecH(QX_IN CDB2D a, int32_t pivoting, int32_t economy,
                           QX_OUT I32_2D permutation, QX_OUT CDB2D q, QX_OUT CDB2D r);
 
-/** As QRDecH, by blocks of reflections where min(m, n) is at least 160 (R. Schreiber and C. F. Van
-    Loan, "A storage-efficient WY representation for products of Householder transformations", 1989):
-    with q, in half the time at order 500, complex ones in 0.8 of it. Below that with the bits of
-    QRDecH. */
+/** As QRDecH, by blocks of reflections where min(m, n) is at least 160: with q, in half the time at
+    order 500, complex ones in 0.8 of it. Below that with the bits of QRDecH. R. Schreiber and C. F.
+    Van Loan, "A storage-efficient WY representation for products of Householder transformations",
+    1989. */
 QX_API ErrorCode QRDec2026H(QX_IN DBL2D a, int32_t pivoting, int32_t economy,
                             QX_OUT I32_2D permutation, QX_OUT DBL2D q, QX_OUT DBL2D r);
 /** As QRDec2026H, for complex elements; the diagonal of r is real. */

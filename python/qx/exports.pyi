@@ -1202,7 +1202,7 @@ def CxQRDecH(a: ArrayLike, pivoting: int, economy: int) -> tuple[NDArray[np.int3
 
 
 def QRDec2026H(a: ArrayLike, pivoting: int, economy: int) -> tuple[NDArray[np.int32], NDArray[np.float64], NDArray[np.float64]]:
-    """As QRDecH, by blocks of reflections where min(m, n) is at least 160 (R. QR factors by ..."""
+    """As QRDecH, by blocks of reflections where min(m, n) is at least 160: with q, in half the time at ..."""
 
 
 def CxQRDec2026H(a: ArrayLike, pivoting: int, economy: int) -> tuple[NDArray[np.int32], NDArray[np.complex128], NDArray[np.complex128]]:
