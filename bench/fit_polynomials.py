@@ -18,6 +18,9 @@ from pocketfft import seconds  # noqa: E402
 from summary import print_summary  # noqa: E402
 
 
+I32 = 3  # the type's code
+
+
 def ratio(ours, theirs, n):
     repeats = max(1, 20_000 // n)
     rounds = [(seconds(ours, repeats), seconds(theirs, repeats)) for _ in range(15)]
@@ -46,6 +49,48 @@ def main():
             print(f"{name:<20} {1e6 * mine:10.1f} us  polyfit {mine / other:5.2f}", flush=True)
             ratios.append((mine / other, name))
     print_summary("polynomial fits, called from Python", "NumPy", ratios)
+    revisions(host, module)
+
+
+def matrix_of(host, values):
+    """A host array of two dimensions, whose elements follow both sizes."""
+    handle = ctypes.c_void_p(host.QXHostNew2D(DBL, *values.shape))
+    block = ctypes.cast(handle, ctypes.POINTER(ctypes.c_void_p))[0]
+    ctypes.memmove(block + 8, np.ascontiguousarray(values).ctypes.data, values.nbytes)
+    return handle
+
+
+def revisions(host, module):
+    """PolyFit2026_head, and GenLSFit2026_head against numpy.linalg.lstsq."""
+    host.QXHostNew2D.restype = ctypes.c_void_p
+    module.PolyFit2026_head.argtypes = ([ctypes.c_void_p] * 2 + [ctypes.c_int32, ctypes.c_void_p, ctypes.c_double]
+                                        + [ctypes.c_void_p] * 5)
+    module.GenLSFit2026_head.argtypes = ([ctypes.c_void_p] * 3 + [ctypes.c_double, ctypes.c_int32]
+                                         + [ctypes.c_void_p] * 4)
+    ratios, general = [], []
+    for n in (20, 100, 1000, 10000, 100000):
+        x, y = np.linspace(-1, 1, n), np.random.default_rng(n).normal(size=n)
+        empty = [block_of(host, DBL, np.zeros(0)), block_of(host, I32, np.zeros(0, np.int32))]
+        handles = [block_of(host, DBL, values) for values in (x, y)]
+        results = [block_of(host, DBL, np.zeros(1)) for _ in range(2)]
+        mse = ctypes.c_double()
+        for order in (1, 3, 6, 12):
+            matrix = np.vander(x, order + 1)
+            rows, inverse = matrix_of(host, matrix), matrix_of(host, np.zeros((0, 0)))
+            cases = [("polynomial", ratios, lambda: module.PolyFit2026_head(
+                *handles, order, empty[0], -1.0, empty[1], empty[0], *results, ctypes.byref(mse)),
+                lambda: np.polyfit(x, y, order)),
+                ("matrix", general, lambda: module.GenLSFit2026_head(
+                    rows, handles[1], empty[0], -1.0, 0, *results, inverse, ctypes.byref(mse)),
+                 lambda: np.linalg.lstsq(matrix, y, rcond=None))]
+            for name, found, ours, theirs in cases:
+                if ours() != 0:
+                    sys.exit("the fit failed")
+                mine, other = ratio(ours, theirs, n)
+                found.append((mine / other, f"n {n}, order {order}"))
+                print(f"{name}, {found[-1][1]:<20} {1e6 * mine:10.1f} us  ratio {mine / other:5.2f}", flush=True)
+    print_summary("polynomial fits, revision, called from Python", "NumPy polyfit", ratios)
+    print_summary("general linear fits, revision, called from Python", "NumPy lstsq", general)
 
 
 if __name__ == "__main__":

@@ -132,9 +132,13 @@ void SymmetricEigenproblem() {
     ratios.summary("dsyev");
 }
 
-void GeneralEigenproblem() {
+enum class Method { Elder, Revision };
+
+void GeneralEigenproblem(Method method) {
     const auto dgeev = qx::bench::PeerRoutine<decltype(dgeev_)>("dgeev_");
-    Ratios ratios("general eigenproblems");
+    const bool isRevision = method == Method::Revision;
+    const auto solve = isRevision ? qx::EigenBlocked<Real> : qx::EigenGeneral<Real>;
+    Ratios ratios(isRevision ? "general eigenproblems, revision" : "general eigenproblems");
     for (const int32_t n : orders) {
         const std::vector<double> a = Random(n);
         std::vector<CDB> w(n), vectors(a.size());
@@ -146,9 +150,9 @@ void GeneralEigenproblem() {
         };
         std::vector<double> work = WorkFor(driver);
         Compare(
-            ratios, "general", n,
+            ratios, isRevision ? "general, revision" : "general", n,
             [&] {
-                qx::EigenGeneral<Real>({a.data(), n, n}, {w.data(), n}, {vectors.data(), n, n});
+                solve({a.data(), n, n}, {w.data(), n}, {vectors.data(), n, n});
             },
             [&] {
                 copy = a;
@@ -158,10 +162,12 @@ void GeneralEigenproblem() {
     ratios.summary("dgeev");
 }
 
-void QR() {
+void QR(Method method) {
     const auto dgeqrf = qx::bench::PeerRoutine<decltype(dgeqrf_)>("dgeqrf_");
     const auto dorgqr = qx::bench::PeerRoutine<decltype(dorgqr_)>("dorgqr_");
-    Ratios ratios("QR factorisations with all of q");
+    const bool isRevision = method == Method::Revision;
+    Ratios ratios(isRevision ? "QR factorisations with all of q, revision"
+                             : "QR factorisations with all of q");
     for (const int32_t n : orders) {
         const std::vector<double> a = Random(n);
         std::vector<double> q(a.size()), r(a.size()), tau(n), copy = a;
@@ -175,10 +181,14 @@ void QR() {
         };
         std::vector<double> work = WorkFor(factor), formWork = WorkFor(form);
         Compare(
-            ratios, "qr", n,
+            ratios, isRevision ? "qr, revision" : "qr", n,
             [&] {
-                qx::QRDecompose<Real>({a.data(), n, n}, qx::qrFull, {q.data(), n, n},
-                                      {r.data(), n, n});
+                if (isRevision)
+                    qx::QRDecomposeBlocked<Real>({a.data(), n, n}, qx::qrFull, {}, {q.data(), n, n},
+                                                 {r.data(), n, n});
+                else
+                    qx::QRDecompose<Real>({a.data(), n, n}, qx::qrFull, {q.data(), n, n},
+                                          {r.data(), n, n});
             },
             [&] {
                 copy = a;
@@ -222,8 +232,10 @@ int main(int argc, char **argv) {
         {"svd2026", [] { SingularValueDecomposition(true, qx::SVDScaling::Always); }},
         {"values2026", [] { SingularValueDecomposition(false, qx::SVDScaling::Always); }},
         {"symmetric", SymmetricEigenproblem},
-        {"general", GeneralEigenproblem},
-        {"qr", QR},
+        {"general", [] { GeneralEigenproblem(Method::Elder); }},
+        {"general2026", [] { GeneralEigenproblem(Method::Revision); }},
+        {"qr", [] { QR(Method::Elder); }},
+        {"qr2026", [] { QR(Method::Revision); }},
         {"cholesky", Cholesky}};
     for (const auto &[name, run] : groups)
         if (argc < 2 || std::find(argv + 1, argv + argc, std::string(name)) != argv + argc)

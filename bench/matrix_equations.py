@@ -1,4 +1,4 @@
-"""Sylvester and Lyapunov equations and functions of matrices against SciPy, in one process.
+"""Sylvester and Lyapunov equations, functions and Schur forms of matrices against SciPy, in one process.
 
 Ours is the export through the binding. SciPy's speed depends on the BLAS that it finds; the first
 line names it.
@@ -100,6 +100,15 @@ def power_cases():
                    lambda: np.linalg.matrix_power(a, -3))
 
 
+def schur_cases():
+    """Unordered, and with the eigenvalues of negative real part first against SciPy's sort of these."""
+    for n in ORDERS:
+        a, = matrices("real", n, 1)
+        yield f"n {n}", lambda: qx.call("Schur2026_head", a, 1, 0), lambda: linalg.schur(a, output="real")
+        yield (f"ordered, n {n}", lambda: qx.call("Schur2026_head", a, 1, 1),
+               lambda: linalg.schur(a, output="real", sort="lhp"))
+
+
 def blas_of_scipy():
     maps = Path("/proc/self/maps").read_text().split()
     return ", ".join(sorted({word for word in maps if re.match("lib.*blas", Path(word).name)}))
@@ -117,3 +126,4 @@ if __name__ == "__main__":
     compare("matrix square roots, revision", "elder",
             function_cases("MatrixSqrt2026_head", None, {"real": "MatrixSqrtH", "complex": "CxMatrixSqrt_head"}))
     compare("matrix powers of -3, revision", "NumPy", power_cases())
+    compare("Schur forms, revision", "SciPy", schur_cases())

@@ -86,6 +86,8 @@ DEFAULTS = {
     "fit": {"w": "{}", "lower": "{}", "upper": "{}", "guess": "{}", "fixedOrders": "{}", "fixedValues": "{}",
             "tolerance": "1e-8", "iterations": "500", "method": 0, "algorithm": 0, "wantCovariance": "1",
             "confidence": "0.95", "deviations": "{}", "parameter": "0.0", "interiorKnots": "{}", "base": "2.71828"},
+    "fit.linear": {"tolerance": "-1.0"}, "fit.polynomial": {"tolerance": "-1.0"},
+    "fit.Fit_covariance": {"tolerance": "-1.0"},
     "interpolate": {"firstSlope": "1e30", "lastSlope": "1e30"},
     "calculus": {"dt": "1.0", "rule": 1, "initial": "{}", "final": "{}"},
     "calculus.derivative": {"rule": 0},

@@ -67,7 +67,8 @@ QX_API ErrorCode PolyFit_head(QX_IN DBL1D x, QX_IN DBL1D y, int32_t order, int32
 QX_API ErrorCode PolyFit80_head(QX_IN DBL1D x, QX_IN DBL1D y, int32_t order, int32_t algorithm,
                                 QX_IN I32_1D fixedOrders, QX_IN DBL1D fixedValues, QX_OUT DBL1D fit,
                                 QX_OUT DBL1D coefficients, QX_OUT double *mse);
-/** As PolyFit80_head, with weights.
+/** As PolyFit80_head, with weights. Of NIST's set Filip the coefficients keep 8.8 digits, of Wampler5
+    6.6; PolyFit2026_head keeps 14 and 15.
     Codes: ErrSizeMismatch (x, y and weights, or orders and values, differ in length),
     ErrPolynomialOrderNegative (order is negative), ErrPolynomialOrderTooHigh (not more samples than
     `order` less the number of fixed orders, or less samples than free terms), ErrOutOfMemory (no
@@ -82,6 +83,26 @@ QX_API ErrorCode PolyFit81_head(QX_IN DBL1D x, QX_IN DBL1D y, int32_t order, QX_
                                 QX_IN DBL1D fixedValues, QX_OUT DBL1D fit,
                                 QX_OUT DBL1D coefficients, QX_OUT double *mse);
 
+/** As PolyFit81_head, with coefficients that are exact to nearly the last digit for x, y and weights
+    as they are given, in place of an algorithm a tolerance, and up to order 50. Without fixed orders
+    Chebyshev polynomials of x brought to [-1, 1] are fitted, else the free powers of x over a power
+    of two, and improved as in GenLSFit2026_head; the coefficients of powers follow in pairs of
+    doubles. Singular values up to n times the tolerance times the largest one count as 0; a
+    tolerance below 0, or NaN, is 2.2e-16. fit has the values before the coefficients are rounded,
+    and *mse is the mean of |w| r^2 of the residuals r = y - fit. What overflows is infinite or NaN.
+    Codes: ErrSizeMismatch (x, y and weights, or orders and values, differ in length), ErrEmptyInput
+    (no samples), ErrPolynomialOrderNegative (order is negative), ErrPolynomialOrderTooHigh (order is
+    above 50, or there are not more samples than `order` less the number of fixed orders, or less
+    samples than free terms), ErrOutOfMemory (no memory, or the host refused a resize),
+    ErrNonFiniteInput (x, y, a weight or a fixed value is not finite), ErrIterationLimit (the
+    singular values do not converge), WarnRankDeficient (singular values count as 0; the results
+    are valid).
+    NaN: x, y, w, fixedValues refused with ErrNonFiniteInput; tolerance in no result. */
+QX_API ErrorCode PolyFit2026_head(QX_IN DBL1D x, QX_IN DBL1D y, int32_t order, QX_IN DBL1D w,
+                                  double tolerance, QX_IN I32_1D fixedOrders,
+                                  QX_IN DBL1D fixedValues, QX_OUT DBL1D fit,
+                                  QX_OUT DBL1D coefficients, QX_OUT double *mse);
+
 /** The coefficients c that minimise the weighted squares of y - H c, for a matrix with one row per
     sample, and fit = H c. algorithm: 0 singular values; 1 to 3 Householder QR; 4 LU
     factorisation of the normal equations, which square the condition of H; 5 Cholesky factorisation
@@ -91,7 +112,8 @@ QX_API ErrorCode PolyFit81_head(QX_IN DBL1D x, QX_IN DBL1D y, int32_t order, QX_
     is not 0, `covariance` is the inverse of H^T |W| H (not scaled by the MSE), else 0 by 0.
     Algorithms 1 to 5 invert that matrix by its singular values, with loss of digits where its norm
     is below 1 (SVD_head): for a condition number of H of 30 measured 2e-10 of the largest element
-    at a norm of 1e-4, 3e-6 at 1e-8 and 4e-2 at 1e-12; 0 and 6 lose none.
+    at a norm of 1e-4, 3e-6 at 1e-8 and 4e-2 at 1e-12; 0 and 6 lose none. Of NIST's set Wampler5 the
+    coefficients keep 6.6 digits, of Longley 11.7; GenLSFit2026_head keeps all that the data determine.
     Codes: ErrSizeMismatch (H, y and weights differ in length), ErrOutOfMemory (no memory, or the
     host refused a resize), ErrOrderNotPositive (H has no columns), ErrPolynomialOrderTooHigh (less
     rows than columns), ErrInvalidSelector (no such algorithm), ErrNonFiniteInput (H or a weight, or
@@ -102,6 +124,24 @@ QX_API ErrorCode PolyFit81_head(QX_IN DBL1D x, QX_IN DBL1D y, int32_t order, QX_
 QX_API ErrorCode GenLSFit80_head(QX_IN DBL2D H, QX_IN DBL1D y, QX_IN DBL1D w, int32_t algorithm,
                                  int32_t wantCovariance, QX_OUT DBL1D coefficients,
                                  QX_OUT DBL1D fit, QX_OUT DBL2D covariance, QX_OUT double *mse);
+/** As GenLSFit80_head, with coefficients that are exact to nearly the last digit for H, y and weights
+    as they are given, where the condition number of H with columns of one length is below 1e13. A
+    solution by the singular values of SVD2026_head is improved by residuals and their products with
+    H in pairs of doubles (A. Bjorck, "Stability analysis of the method of seminormal equations for
+    linear least squares problems", 1987). Columns and y are scaled by powers of two first. Singular
+    values up to n times the tolerance times the largest one count as 0, and of all solutions the one
+    with the shortest scaled coefficients is taken; a tolerance below 0, or NaN, is 2.2e-16. fit has
+    the values before the coefficients are rounded, and *mse is the mean of |w| r^2 of the residuals
+    r = y - fit. What overflows is infinite.
+    Codes: ErrSizeMismatch (H, y and weights differ in length), ErrOrderNotPositive (H has no
+    columns), ErrPolynomialOrderTooHigh (less rows than columns), ErrOutOfMemory (no memory, or the
+    host refused a resize), ErrNonFiniteInput (H, y or a weight is not finite), ErrIterationLimit
+    (the singular values do not converge), WarnRankDeficient (singular values count as 0; the results
+    are valid).
+    NaN: H, y, w refused with ErrNonFiniteInput; tolerance in no result. */
+QX_API ErrorCode GenLSFit2026_head(QX_IN DBL2D H, QX_IN DBL1D y, QX_IN DBL1D w, double tolerance,
+                                   int32_t wantCovariance, QX_OUT DBL1D coefficients,
+                                   QX_OUT DBL1D fit, QX_OUT DBL2D covariance, QX_OUT double *mse);
 /** As GenLSFit80_head, with standard deviations: the weights are 1 / sd^2, and 1 where sd is 0.
     NaN: H, deviations refused with ErrNonFiniteInput or refused with ErrSingularMatrix; y refused
     with ErrNonFiniteInput or in all results or in some results. */

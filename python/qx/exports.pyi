@@ -441,6 +441,14 @@ def CxEigenValueVector_head(a: ArrayLike, matrixType: int, output: int) -> tuple
     """As EigenValueVector_head, for complex elements. Eigenvalues of the square matrix a and eigenvectors."""
 
 
+def EigenValueVector2026_head(a: ArrayLike, output: int) -> tuple[NDArray[np.complex128], NDArray[np.complex128]]:
+    """As EigenValueVector_head, by blocks from order 160 on, in half the time at order 500: reduction ..."""
+
+
+def CxEigenValueVector2026_head(a: ArrayLike, matrixType: int, output: int) -> tuple[NDArray[np.complex128], NDArray[np.complex128]]:
+    """As CxEigenValueVector_head, for general matrices by blocks from order 160 on as ..."""
+
+
 def SymEvectorEvalue_head(a: ArrayLike, output: int) -> tuple[NDArray[np.float64], NDArray[np.float64]]:
     """Eigenvalues, ascending, of the symmetric matrix whose lower triangle a holds."""
 
@@ -889,8 +897,16 @@ def PolyFit81_head(x: ArrayLike, y: ArrayLike, order: int, w: ArrayLike, algorit
     """As PolyFit80_head, with weights. The polynomial sum of coefficients[j] x^j, j = 0 to `order`, ..."""
 
 
+def PolyFit2026_head(x: ArrayLike, y: ArrayLike, order: int, w: ArrayLike, tolerance: float, fixedOrders: ArrayLike, fixedValues: ArrayLike) -> tuple[NDArray[np.float64], NDArray[np.float64], float]:
+    """As PolyFit81_head, with coefficients that are exact to nearly the last digit for x, y and ..."""
+
+
 def GenLSFit80_head(H: ArrayLike, y: ArrayLike, w: ArrayLike, algorithm: int, wantCovariance: int) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], float]:
     """The coefficients c that minimise the weighted squares of y - H c, for a matrix with one row per ..."""
+
+
+def GenLSFit2026_head(H: ArrayLike, y: ArrayLike, w: ArrayLike, tolerance: float, wantCovariance: int) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], float]:
+    """As GenLSFit80_head, with coefficients that are exact to nearly the last digit for H, y and ..."""
 
 
 def GenLSFit_head(H: ArrayLike, y: ArrayLike, deviations: ArrayLike, algorithm: int, wantCovariance: int) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.float64], float]:
@@ -1183,6 +1199,14 @@ def QRDecH(a: ArrayLike, pivoting: int, economy: int) -> tuple[NDArray[np.int32]
 
 def CxQRDecH(a: ArrayLike, pivoting: int, economy: int) -> tuple[NDArray[np.int32], NDArray[np.complex128], NDArray[np.complex128]]:
     """As QRDecH, for complex elements; the diagonal of r is real. QR factors by Householder ..."""
+
+
+def QRDec2026H(a: ArrayLike, pivoting: int, economy: int) -> tuple[NDArray[np.int32], NDArray[np.float64], NDArray[np.float64]]:
+    """As QRDecH, by blocks of reflections where min(m, n) is at least 160: with q, in half the time at ..."""
+
+
+def CxQRDec2026H(a: ArrayLike, pivoting: int, economy: int) -> tuple[NDArray[np.int32], NDArray[np.complex128], NDArray[np.complex128]]:
+    """As QRDec2026H, for complex elements; the diagonal of r is real. QR factors by Householder ..."""
 
 
 def SVD_head(a: ArrayLike) -> tuple[NDArray[np.float64], NDArray[np.float64], NDArray[np.float64]]:

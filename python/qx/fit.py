@@ -32,6 +32,7 @@ core = served("fit")
 EMPTY = np.empty(0)
 NATURAL = 2.71828  # the exports take these digits for e
 TOLERANCE, ITERATIONS = 1e-12, 2000
+AS_EPSILON = -1.0  # of a tolerance for singular values
 METHODS = {"least squares": 0, "absolute": 1, "bisquare": 2}
 LOSSES = {"linear": 0, "soft_l1": 1, "huber": 2, "cauchy": 3, "arctan": 4}
 UNDETERMINED = 3  # the reason for the end of a fit
@@ -348,7 +349,7 @@ def _finished(model: Any, x: Any, y: Any, w: Any, p: Any, fixed: Any = None, abs
     if not is_known and len(free) and len(x) >= len(free):
         rows = np.ascontiguousarray(model.jacobian(x, p)[:, free])
         if np.all(np.isfinite(rows)):
-            inverse = core.Fit_covariance(rows, residuals, w, 0, 1)[2]
+            inverse = core.Fit_covariance(rows, np.zeros(len(rows)), w, 0.0, 1)[2]
             covariance[np.ix_(free, free)] = inverse if absolute else inverse * variance
         else:
             covariance[np.ix_(free, free)] = np.nan
@@ -480,7 +481,7 @@ def polynomial(x: ArrayLike, y: ArrayLike, degree: int, sigma: ArrayLike | None 
     names = [f"c{j}" for j in range(degree + 1)]
     given = fixed or {}
     orders = [chosen("fit.polynomial", "fixed", name, {one: j for j, one in enumerate(names)}) for name in given]
-    p = core.polynomial(x, y, degree, w, 0, orders, [float(value) for value in given.values()])[1]
+    p = core.polynomial(x, y, degree, w, AS_EPSILON, orders, [float(value) for value in given.values()])[1]
     return _finished(_polynomial(degree), x, y, w, p, [name in given for name in names])
 
 
@@ -737,7 +738,7 @@ def linear(H: ArrayLike, y: ArrayLike, sigma: ArrayLike | None = None,
     if len(names) != H.shape[1]:
         refuse("fit.linear", "names", f"{H.shape[1]} are needed; {len(names)} came", "ErrSizesDisagree")
     _, y, w = _samples("linear", np.zeros(len(H)), y, sigma)
-    p = core.linear(H, y, w, 0, 0)[0]
+    p = core.linear(H, y, w, AS_EPSILON, 0)[0]
     return _finished(_rows(tuple(names)), H, y, w, p)
 
 

@@ -66,6 +66,18 @@ def gammaln(x: ArrayLike) -> Any:
     return core.gammaln(x)
 
 
+def _incomplete(a: Any, x: Any, direct: Any, large: Any, what: int) -> Any:
+    """An incomplete gamma function; for large a as the chi-square distribution, which costs some times as much
+    and keeps the digits."""
+    a, x = np.broadcast_arrays(np.asarray(a, float), np.asarray(x, float))
+    value = np.asarray(direct(a, x))
+    is_large = (a > 100) & (a < 5e24) & (x >= 0) & (x < 8e307)
+    if np.any(is_large):
+        value = value.copy()
+        value[is_large] = large(2 * x[is_large], 2 * a[is_large], what)
+    return value[()]
+
+
 def gammainc(a: ArrayLike, x: ArrayLike) -> Any:
     r"""The regularised lower incomplete gamma function.
 
@@ -88,7 +100,7 @@ def gammainc(a: ArrayLike, x: ArrayLike) -> Any:
     >>> qx.special.gammainc(2.0, 3.0)
     0.8008517265285442
     """
-    return core.gammainc(a, x, 0)
+    return _incomplete(a, x, lambda a, x: core.gammainc(a, x, 0), core.gammainc_large, 0)
 
 
 def gammaincc(a: ArrayLike, x: ArrayLike) -> Any:
@@ -113,7 +125,7 @@ def gammaincc(a: ArrayLike, x: ArrayLike) -> Any:
     >>> qx.special.gammaincc(2.0, 3.0)
     0.1991482734714558
     """
-    return core.gammaincc(a, x)
+    return _incomplete(a, x, core.gammaincc, core.gammaincc_large, 1)
 
 
 def beta(a: ArrayLike, b: ArrayLike) -> Any:

@@ -326,6 +326,11 @@ class Special(unittest.TestCase):
                                   theirs if isinstance(theirs, tuple) else [theirs]):
                 with self.subTest(name=name):
                     close(one, other, 1e-7, 1e-9)
+        # Next to the median of a large parameter, by the first terms of its series, and outside the domain.
+        near = 1 / (3 * np.sqrt(2 * np.pi * 1e9))
+        close(special.gammainc([1e9, 2.0], [1e9, 3.0]), [0.5 + near, scipy.special.gammainc(2, 3)], 1e-13)
+        close(special.gammaincc(1e9, 1e9), 0.5 - near, 1e-13)
+        self.assertTrue(np.isnan(special.gammainc(1e9, -1.0)))
         close(special.kelvin(0, 2.0)[:2], [scipy.special.ber(2), scipy.special.bei(2)])
         close(special.pbdv(1.5, 1.0), scipy.special.pbdv(1.5, 1.0)[0])
         close(special.dawsn(1.5), scipy.special.dawsn(1.5))

@@ -51,7 +51,91 @@ int32_t Answer(const CDB *work) { return static_cast<int32_t>(work->re); }
 
 char Job(const void *vectors) { return vectors != nullptr ? 'V' : 'N'; }
 
+// Asks a driver how much work memory it wants, and calls it with that.
+template <class T, class Driver>
+int32_t WithWork(const Driver &driver) {
+    ScratchParts memory;
+    T *work, size;
+    int32_t info = 0;
+    driver(&size, -1, &info);
+    const int32_t length = Answer(&size);
+    if (memory.take(Aligned(Sized(work, length))) != 0)
+        return noMemory;
+    driver(work, length, &info);
+    return info;
+}
+
 } // namespace
+
+int32_t Eigen(int32_t n, DBL *a, CDB *w, DBL *z) {
+    ScratchParts results;
+    DBL *wr, *wi;
+    if (results.take(Aligned(Sized(wr, n)), Aligned(Sized(wi, n))) != 0)
+        return noMemory;
+    const char job = Job(z);
+    const int32_t one = 1;
+    const int32_t info = WithWork<DBL>([&](DBL *work, int32_t length, int32_t *status) {
+        LAPACK_dgeev("N", &job, &n, a, &n, wr, wi, nullptr, &one, z, &n, work, &length, status);
+    });
+    for (int32_t i = 0; i < n; ++i)
+        w[i] = {wr[i], wi[i]};
+    return info;
+}
+int32_t Eigen(int32_t n, CDB *a, CDB *w, CDB *z) {
+    ScratchParts results;
+    DBL *real;
+    CDB *values;
+    if (results.take(Aligned(Sized(real, 2 * int64_t{n})), Aligned(Sized(values, n))) != 0)
+        return noMemory;
+    const char job = Job(z);
+    const int32_t one = 1;
+    const int32_t info = WithWork<CDB>([&](CDB *work, int32_t length, int32_t *status) {
+        LAPACK_zgeev("N", &job, &n, a, &n, values, nullptr, &one, z, &n, work, &length, real,
+                     status);
+    });
+    for (int32_t i = 0; i < n; ++i)
+        w[i] = values[i];
+    return info;
+}
+
+int32_t FactorQR(int32_t m, int32_t n, DBL *a, DBL *tau) {
+    return WithWork<DBL>([&](DBL *work, int32_t length, int32_t *info) {
+        LAPACK_dgeqrf(&m, &n, a, &m, tau, work, &length, info);
+    });
+}
+int32_t FactorQR(int32_t m, int32_t n, CDB *a, CDB *tau) {
+    return WithWork<CDB>([&](CDB *work, int32_t length, int32_t *info) {
+        LAPACK_zgeqrf(&m, &n, a, &m, tau, work, &length, info);
+    });
+}
+int32_t FactorPivotedQR(int32_t m, int32_t n, DBL *a, I32 *pivots, DBL *tau) {
+    for (int32_t j = 0; j < n; ++j) // any column may be exchanged
+        pivots[j] = 0;
+    return WithWork<DBL>([&](DBL *work, int32_t length, int32_t *info) {
+        LAPACK_dgeqp3(&m, &n, a, &m, pivots, tau, work, &length, info);
+    });
+}
+int32_t FactorPivotedQR(int32_t m, int32_t n, CDB *a, I32 *pivots, CDB *tau) {
+    ScratchParts memory;
+    DBL *real;
+    if (memory.take(Aligned(Sized(real, 2 * int64_t{n}))) != 0)
+        return noMemory;
+    for (int32_t j = 0; j < n; ++j) // any column may be exchanged
+        pivots[j] = 0;
+    return WithWork<CDB>([&](CDB *work, int32_t length, int32_t *info) {
+        LAPACK_zgeqp3(&m, &n, a, &m, pivots, tau, work, &length, real, info);
+    });
+}
+int32_t FormQ(int32_t m, int32_t columns, int32_t reflections, DBL *q, const DBL *tau) {
+    return WithWork<DBL>([&](DBL *work, int32_t length, int32_t *info) {
+        LAPACK_dorgqr(&m, &columns, &reflections, q, &m, tau, work, &length, info);
+    });
+}
+int32_t FormQ(int32_t m, int32_t columns, int32_t reflections, CDB *q, const CDB *tau) {
+    return WithWork<CDB>([&](CDB *work, int32_t length, int32_t *info) {
+        LAPACK_zungqr(&m, &columns, &reflections, q, &m, tau, work, &length, info);
+    });
+}
 
 int32_t Schur(int32_t n, DBL *t, CDB *w, DBL *z) {
     ScratchParts results, working;

@@ -38,8 +38,8 @@ int32_t SolveTridiagonal(bool transposed, int32_t n, int32_t rightSides, const D
                          const DBL *diagonal, const DBL *upper, const DBL *upper2,
                          const I32 *pivots, DBL *b);
 
-// What follows takes scratch memory of its own for LAPACK's work. All matrices are of order n and
-// are Aligned (linalg/aligned.h).
+// What follows takes scratch memory of its own for LAPACK's work. All matrices are Aligned
+// (linalg/aligned.h), and of order n where no other size is named.
 
 // Schur form of t: t becomes triangular, or for real elements quasi-triangular, w its eigenvalues,
 // and z its Schur vectors; with z null there are none. Above 0: no convergence.
@@ -48,6 +48,20 @@ int32_t Schur(int32_t n, CDB *t, CDB *w, CDB *z);
 // Moves the block at row `from` of a Schur form to row `to`, rows counted from 0.
 int32_t MoveInSchur(int32_t n, DBL *t, DBL *z, int32_t from, int32_t to);
 int32_t MoveInSchur(int32_t n, CDB *t, CDB *z, int32_t from, int32_t to);
+
+// Eigenvalues of a, which is lost: w; with z not null the right eigenvectors of unit length, for real
+// elements as GeneralisedVectors gives them. Above 0: no convergence.
+int32_t Eigen(int32_t n, DBL *a, CDB *w, DBL *z);
+int32_t Eigen(int32_t n, CDB *a, CDB *w, CDB *z);
+
+// QR factors of a (m by n), with columns in their order, or exchanged by pivots, which count from 1;
+// then of q, which holds the reflections, the first `columns` columns.
+int32_t FactorQR(int32_t m, int32_t n, DBL *a, DBL *tau);
+int32_t FactorQR(int32_t m, int32_t n, CDB *a, CDB *tau);
+int32_t FactorPivotedQR(int32_t m, int32_t n, DBL *a, I32 *pivots, DBL *tau);
+int32_t FactorPivotedQR(int32_t m, int32_t n, CDB *a, I32 *pivots, CDB *tau);
+int32_t FormQ(int32_t m, int32_t columns, int32_t reflections, DBL *q, const DBL *tau);
+int32_t FormQ(int32_t m, int32_t columns, int32_t reflections, CDB *q, const CDB *tau);
 
 // Generalised Schur form of s and t, which become (quasi-)triangular: the eigenvalues are
 // alpha[i] / beta[i], and q and z the left and the right Schur vectors.

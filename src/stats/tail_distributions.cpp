@@ -1,6 +1,7 @@
 #include "stats/tail_distributions.h"
 
 #include "frame/constants.h"
+#include "special/digamma.h"
 #include "special/gamma.h"
 #include "special/logarithms.h"
 #include "special/tables/normal.h"
@@ -24,6 +25,8 @@ Extended Whole(double x) { return {x, 0.0}; }
 constexpr double kLeastDegrees = 1e-300;
 constexpr double kLeastHalf = 5e-321; // of chi-square: a quotient by it is not 0
 constexpr double kLeastStudentDegrees = 1e-25;
+constexpr double kFewDegrees = 1e-25;  // of Fisher's: below it a part is proportional to them
+constexpr double kFlatDegrees = 1e-20; // of Fisher's, where the others are few
 
 double Limited(double degrees) { return std::clamp(degrees, kLeastDegrees, kMostDegrees); }
 
@@ -115,7 +118,35 @@ UnitPoint FisherShare(double f, double n, double d) {
     return UnitPoint::Share(ExactProduct(f * scale, n), Whole(d * scale));
 }
 
+// Where n is few degrees beside d, the part above f is n times an integral over t^-1 that does not
+// depend on n but for its end; where d is, the part below f is that with 1 / f.
+Tails FewFisherTails(double f, double n, double d) {
+    const bool isFirst = n < d;
+    const double few = isFirst ? n : d, many = isFirst ? d : n;
+    const double logarithm =
+        std::log(few) + (isFirst ? std::log(f) : -std::log(f)) - std::log(many);
+    if (logarithm < -650.0) { // the incomplete beta integral from 0 to its first term
+        const double integral = -logarithm - Digamma(0.5 * many) - kEuler;
+        return {{few * (0.5 * integral), Whole(0.0)}, !isFirst, {0.5 * few, Whole(0.0)}};
+    }
+    Tails tails = BetaTails(0.5 * (isFirst ? kFewDegrees : n), 0.5 * (isFirst ? d : kFewDegrees),
+                            FisherShare(f, n, d));
+    tails.smaller = tails.smaller * (few / kFewDegrees);
+    tails.slope = tails.slope * (few / kFewDegrees);
+    return tails;
+}
+
+// With few degrees of both the parts do not depend on f.
+Tails FlatFisherTails(double n, double d) {
+    const double below = d / (n + d), above = n / (n + d);
+    return {{std::min(below, above), Whole(0.0)}, below <= above, {0.5 * n * below, Whole(0.0)}};
+}
+
 Tails FisherTails(double f, double n, double d) {
+    if (std::min(n, d) < kFewDegrees && std::max(n, d) < kFlatDegrees)
+        return FlatFisherTails(n, d);
+    if (std::min(n, d) < kFewDegrees)
+        return FewFisherTails(f, n, d);
     return BetaTails(0.5 * n, 0.5 * d, FisherShare(f, n, d));
 }
 
@@ -242,8 +273,8 @@ double StudentValue(double t, double dof, DistributionValue what) {
 }
 
 double FisherValue(double f, double n, double d, DistributionValue what) {
-    n = Limited(n);
-    d = Limited(d);
+    n = std::min(n, kMostDegrees);
+    d = std::min(d, kMostDegrees);
     if (f == 0.0 && what == DistributionValue::Density)
         return DensityAtZero(n, 1.0);
     if (f <= 0.0 || std::isinf(f))
@@ -308,8 +339,8 @@ double FisherPoint(double p, bool isUpper, double n, double d) {
     double end;
     if (IsAtEnd(p, isUpper, 0.0, &end))
         return end;
-    n = Limited(n);
-    d = Limited(d);
+    n = std::min(n, kMostDegrees);
+    d = std::min(d, kMostDegrees);
     TakeSmaller(p, isUpper);
     const double z = UpperNormalPoint(p);
     const double spread = std::min(std::sqrt(2.0 / n + 2.0 / d), 50.0);

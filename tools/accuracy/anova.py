@@ -1,5 +1,5 @@
 #!/usr/bin/python3
-"""Writes docs/accuracy/anova.md: the errors of the analysis of variance with two and three factors,
+"""Writes docs/accuracy/anova.md: the errors of the analysis of variance and of contingency tables,
 against exact fractions and probabilities of 40 digits, beside R's and SciPy's.
 
     QX_LIBRARY_DIR=build/release PYTHONPATH=python tools/accuracy/anova.py
@@ -13,6 +13,7 @@ import sys
 from fractions import Fraction
 from pathlib import Path
 
+import mpmath
 import numpy as np
 from scipy import stats
 
@@ -187,6 +188,34 @@ def one_way_rows():
         yield f"| {name} | " + " | ".join(text(float(abs(Fraction(float(v)) / f - 1) / EPS)) for v in found) + " |"
 
 
+CONTINGENCY = {
+    "2 by 2, nearly independent": [[1001, 999], [998, 1003]],
+    "hair and eyes, 4 by 4": [[68, 119, 26, 7], [20, 84, 17, 94], [15, 54, 14, 10], [5, 29, 14, 16]],  # Snee, 1974
+    "3 by 2, dependent": [[400, 20], [30, 350], [200, 210]],
+    "2 by 2, nearly diagonal": [[200, 1], [3, 190]],
+    "2 by 2, large counts": [[2000000000, 1999900000], [1999800000, 2000000000]],
+}
+
+
+def contingency_rows():
+    mpmath.mp.dps = 60
+    for name, counts in CONTINGENCY.items():
+        rows, cols = [sum(row) for row in counts], [sum(col) for col in zip(*counts)]
+        total = sum(rows)
+        exact = sum((o - Fraction(r * c, total))**2 / Fraction(r * c, total)
+                    for row, r in zip(counts, rows) for o, c in zip(row, cols))
+        dof = (len(rows) - 1) * (len(cols) - 1)
+        half = mpmath.mpf(exact.numerator) / exact.denominator / 2
+        p = mpmath.gammainc(mpmath.mpf(dof) / 2, half, mpmath.inf, regularized=True)
+        found = [qx.call(export, np.array(counts, np.int32)) for export in ("Contingency_head", "Contingency2026_head")]
+        found.append(stats.chi2_contingency(np.array(counts, float), correction=False)[:2])
+        cells = []
+        for chi_square, probability in found:
+            cells.append(text(float(abs(Fraction(float(chi_square)) / exact - 1) / EPS)))
+            cells.append(text(float(abs(mpmath.mpf(float(probability)) / p - 1) / 2.0**-52)))
+        yield f"| {name} | {mpmath.nstr(p, 3)} | " + " | ".join(cells) + " |"
+
+
 def table(head, rows):
     lines = ["| " + " | ".join(head) + " |", "|---" * len(head) + "|"]
     for row in rows:
@@ -221,4 +250,10 @@ of the same doubles.
 **Critical values** by significance, over all sources of the data above with fixed factors.
 
 {table(["Significance", "ours", "R qf", "SciPy f.isf"], critical_rows())}
+
+**Contingency tables**: the statistic against exact fractions, p against 60 digits. The revision takes p of the
+rounded statistic, of which half an ulp counts as many times in a small p as half the statistic says.
+
+{table(["Table", "p", "Contingency_head: statistic", "p", "Contingency2026_head: statistic", "p",
+        "SciPy: statistic", "p"], contingency_rows())}
 """)

@@ -28,7 +28,8 @@ NEWEST = {
         "Filter_cascade": "IIR_Filter2", "Filter_cascade_complex": "CxSigIIR_Filter2",
         "Filter_direct": "IIR_Filter", "Filter_direct_complex": "CxSigIIR_Filter",
         "Filter_complex": "CxIIR_Filter_H", "Filter_complex_of_real": "CxIIRReSig_Filter_H",
-        "Filter_roots": "EigenValueVector_head", "Filter_roots_complex": "CxEigenValueVector_head",
+        "Filter_roots": "EigenValueVector2026_head",
+        "Filter_roots_complex": "CxEigenValueVector2026_head",
         "Filter_polynomial": "CxPolyEv",
         "savgol": "SavitzkyGolayFiltH", "savgol_coefficients": "SavitzkyGolayCoefH",
         "median": "MedianFilter81_H",
@@ -100,10 +101,10 @@ NEWEST = {
         "norm_complex": "CxNorm2026_head", "norm_vector": "vectorNormH", "norm_vector_complex":
         "CxVectorNormH", "cond": "CondNumber2026_head", "cond_complex": "CxCondNumber2026_head",
         "matrix_rank": "Rank2026_head", "matrix_rank_complex": "CxRank2026_head", "eig":
-        "EigenValueVector_head", "eig_complex": "CxEigenValueVector_head", "eig_general":
+        "EigenValueVector2026_head", "eig_complex": "CxEigenValueVector2026_head", "eig_general":
         "GenEigenEx_head", "eig_general_complex": "CxGenEigenEx_head", "eigh":
         "SymEvectorEvalue_head", "svd": "SVD2026_head", "svd_complex": "CxSVD2026_head", "svdvals":
-        "SVDS2026_head", "svdvals_complex": "CxSVDS2026_head", "qr": "QRDecH", "qr_complex": "CxQRDecH",
+        "SVDS2026_head", "svdvals_complex": "CxSVDS2026_head", "qr": "QRDec2026H", "qr_complex": "CxQRDec2026H",
         "cholesky": "FullCholesky_head", "cholesky_complex": "CxFullCholesky_head", "schur":
         "Schur2026_head", "schur_complex": "CxSchur80_head", "qz": "QZ80_head", "qz_complex":
         "CxQZ80_head", "hessenberg": "Hessenberg_head", "hessenberg_complex": "CxHessenberg_head",
@@ -149,6 +150,7 @@ NEWEST = {
     },
     "special": {
         "gamma": "QX_Gamma_85", "gammaln": "QX_LnGamma", "gammainc": "QX_Gamma_85",
+        "gammainc_large": "ChiSquare2026_head", "gammaincc_large": "ChiSquare2026_head",
         "gammaincc": "QX_GammaC", "beta": "QX_Beta_85", "betainc": "QX_Beta_85",
         "factorial": "QX_Fact", "factorialln": "QX_LnFact", "digamma": "QX_Psi",
         "zeta": "QX_Zeta", "stirling": "QX_Stirling", "erf": "QX_Erf", "erfc": "QX_ErfC",
@@ -174,13 +176,13 @@ NEWEST = {
     },
     "fit": {
         "line": "BoundLinearFit_head", "line_absolute": "BoundLinearFitLAR_head",
-        "line_bisquare": "BoundLinearFitBi_head", "polynomial": "PolyFit81_head",
+        "line_bisquare": "BoundLinearFitBi_head", "polynomial": "PolyFit2026_head",
         "exponential": "BoundExpFit_head", "power": "BoundPowerFit_head",
         "logarithm": "BoundLogFit_head", "gaussian": "BoundGaussianFit2026_head",
         "gaussian_peak": "GaussianPeakFit2026_head",
-        "linear": "GenLSFit80_head", "curve": "NonlinearFit2026",
+        "linear": "GenLSFit2026_head", "curve": "NonlinearFit2026",
         "nonlinear": "NonlinearFit2026",
-        "Fit_covariance": "GenLSFit80_head", "Fit_confidence": "ConfBndGenLS_head",
+        "Fit_covariance": "GenLSFit2026_head", "Fit_confidence": "ConfBndGenLS_head",
         "Fit_prediction": "PredBndGenLS_head", "SmoothingSpline": "CubicSplineFit_head",
         "BSpline": "BSplineFit_head",
     },

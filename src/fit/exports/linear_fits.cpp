@@ -5,6 +5,7 @@
 #include "fit/general.h"
 #include "fit/line.h"
 #include "fit/polynomial.h"
+#include "fit/refined.h"
 #include "fit/residuals.h"
 
 #include <cstring>
@@ -93,6 +94,46 @@ Outcome FitMatrix(In<DBL2D> h, In<DBL1D> y, In<DBL1D> w, int32_t algorithm, int3
                       covariance.view(), {fit.view(), mse.address()});
 }
 
+Outcome FitPoly2026(In<DBL1D> x, In<DBL1D> y, int32_t order, In<DBL1D> w, double tolerance,
+                    In<I32_1D> fixedOrders, In<DBL1D> fixedValues, Out<DBL1D> fit,
+                    Out<DBL1D> coefficients, OutDBL mse) {
+    const int32_t n = x.size(), fixed = fixedOrders.size();
+    if (y.size() != n || !WeightsFit(w, n) || fixedValues.size() != fixed)
+        return ErrSizeMismatch;
+    if (n < 1)
+        return ErrEmptyInput;
+    if (const ErrorCode failed = CheckPolynomialOrder(n, order, fixed))
+        return failed;
+    if (order > highestRefined)
+        return ErrPolynomialOrderTooHigh;
+    if (const Outcome bad = fit.resize(n))
+        return bad;
+    if (const Outcome bad = coefficients.resize(order + 1))
+        return bad;
+    return FitPolynomialRefined({x.view(), y.view(), w.view()},
+                                {fixedOrders.view(), fixedValues.view()}, tolerance,
+                                coefficients.view(), {fit.view(), mse.address()});
+}
+
+Outcome FitMatrix2026(In<DBL2D> h, In<DBL1D> y, In<DBL1D> w, double tolerance,
+                      int32_t wantCovariance, Out<DBL1D> coefficients, Out<DBL1D> fit,
+                      Out<DBL2D> covariance, OutDBL mse) {
+    const int32_t k = h.cols(), side = wantCovariance != 0 ? k : 0;
+    if (const Outcome bad =
+            FirstFailed({{y.size() != h.rows() || !WeightsFit(w, y.size()), ErrSizeMismatch},
+                         {k < 1, ErrOrderNotPositive},
+                         {h.rows() < k, ErrPolynomialOrderTooHigh}}))
+        return bad;
+    if (const Outcome bad = coefficients.resize(k))
+        return bad;
+    if (const Outcome bad = fit.resize(y.size()))
+        return bad;
+    if (const Outcome bad = covariance.resize(side, side))
+        return bad;
+    return FitGeneralRefined(h.view(), {{}, y.view(), w.view()}, tolerance, coefficients.view(),
+                             covariance.view(), {fit.view(), mse.address()});
+}
+
 Outcome ScoreFit(In<DBL1D> y, In<DBL1D> fit, In<DBL1D> w, int32_t dof, OutDBL sse, OutDBL rSquare,
                  OutDBL rmse) {
     if (const Outcome bad =
@@ -163,6 +204,13 @@ ErrorCode PolyFit81_head(DBL1D x, DBL1D y, int32_t order, DBL1D w, int32_t algor
                     coefficients, mse);
 }
 
+ErrorCode PolyFit2026_head(DBL1D x, DBL1D y, int32_t order, DBL1D w, double tolerance,
+                           I32_1D fixedOrders, DBL1D fixedValues, DBL1D fit, DBL1D coefficients,
+                           double *mse) {
+    return Returned(qx::FitPoly2026, x, y, order, w, tolerance, fixedOrders, fixedValues, fit,
+                    coefficients, mse);
+}
+
 ErrorCode GenLSFit_head(DBL2D H, DBL1D y, DBL1D deviations, int32_t algorithm,
                         int32_t wantCovariance, DBL1D coefficients, DBL1D fit, DBL2D covariance,
                         double *mse) {
@@ -173,6 +221,12 @@ ErrorCode GenLSFit80_head(DBL2D H, DBL1D y, DBL1D w, int32_t algorithm, int32_t 
                           DBL1D coefficients, DBL1D fit, DBL2D covariance, double *mse) {
     return Returned(qx::FitMatrix<Given::Weights>, H, y, w, algorithm, wantCovariance, coefficients,
                     fit, covariance, mse);
+}
+
+ErrorCode GenLSFit2026_head(DBL2D H, DBL1D y, DBL1D w, double tolerance, int32_t wantCovariance,
+                            DBL1D coefficients, DBL1D fit, DBL2D covariance, double *mse) {
+    return Returned(qx::FitMatrix2026, H, y, w, tolerance, wantCovariance, coefficients, fit,
+                    covariance, mse);
 }
 
 ErrorCode GoodnessOfFit_head(DBL1D y, DBL1D fit, DBL1D w, int32_t dof, double *sse, double *rSquare,

@@ -99,6 +99,26 @@ std::vector<Recipe> PolynomialRecipes() {
          },
          None,
          {4, 8, 50, 1000}},
+        {"PolyFit2026_head",
+         [](Call &c) {
+             c.mayBeEmpty(3);
+             c.mayBeEmpty(4);
+             return PolyFit2026_head(Times(c, 0), c.in<DBL>(1), 3, NoWeights(c, 2), -1.0,
+                                     c.in<I32>(3, 0), c.in<DBL>(4, 0), c.out<DBL>(0), c.out<DBL>(1),
+                                     c.scalar(0));
+         },
+         None,
+         {4, 8, 50, 1000}},
+        {"PolyFit2026_head: fixed terms",
+         [](Call &c) {
+             c.mayBeEmpty(3);
+             c.mayBeEmpty(4);
+             return PolyFit2026_head(Times(c, 0), c.in<DBL>(1), 3, Weights(c, 2), 1e-12,
+                                     c.in<I32>(3, 2, [](int32_t i) { return 2 * i; }),
+                                     c.in<DBL>(4, 2), c.out<DBL>(0), c.out<DBL>(1), c.scalar(0));
+         },
+         None,
+         {4, 8, 50, 1000}},
         {"PolyFit_head: order 30",
          [](Call &c) {
              return PolyFit_head(c.in<DBL>(0, c.n, [&](int32_t i) { return 2.0 * i / c.n - 1.0; }),
@@ -126,6 +146,22 @@ DBL2D Terms(Call &c, int number) {
 
 std::vector<Recipe> GeneralRecipes() {
     std::vector<Recipe> recipes;
+    recipes.push_back({"GenLSFit2026_head",
+                       [](Call &c) {
+                           return GenLSFit2026_head(Terms(c, 0), c.in<DBL>(1), Weights(c, 2), -1.0,
+                                                    1, c.out<DBL>(0), c.out<DBL>(1),
+                                                    c.out2D<DBL>(2), c.scalar(0));
+                       },
+                       None,
+                       {3, 8, 50, 1000}});
+    recipes.push_back({"GenLSFit2026_head: unweighted",
+                       [](Call &c) {
+                           return GenLSFit2026_head(Terms(c, 0), c.in<DBL>(1), NoWeights(c, 2), 0.1,
+                                                    0, c.out<DBL>(0), c.out<DBL>(1),
+                                                    c.out2D<DBL>(2), c.scalar(0));
+                       },
+                       None,
+                       {3, 8, 50, 1000}});
     for (int32_t algorithm = 0; algorithm < 7; ++algorithm) {
         const std::string variant = ": algorithm " + std::to_string(algorithm);
         recipes.push_back({"GenLSFit80_head" + variant,

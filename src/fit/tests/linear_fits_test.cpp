@@ -261,6 +261,147 @@ TEST(LinearFits, ColumnsOfAnySizeCostNoDigits) {
     }
 }
 
+GeneralFit FitRefined(const Rows &rows, const Samples &y, const Samples &w, double tolerance) {
+    return FitRows(
+        [&](auto h, auto target, auto weights, int32_t, int32_t covariance, auto c, auto fit,
+            auto inverse, double *mse) {
+            return GenLSFit2026_head(h, target, weights, tolerance, covariance, c, fit, inverse,
+                                     mse);
+        },
+        rows, y, w, 0, 1);
+}
+PolynomialFit FitPowersRefined(const Samples &x, const Samples &y, int32_t order,
+                               const Samples &w = {}, const std::vector<int32_t> &orders = {},
+                               const Samples &values = {}) {
+    const DBLArray fit, c;
+    PolynomialFit result = {};
+    result.code =
+        PolyFit2026_head(DBLArray(x).handle(), DBLArray(y).handle(), order, DBLArray(w).handle(),
+                         -1.0, I32Array(orders).handle(), DBLArray(values).handle(), fit.handle(),
+                         c.handle(), &result.mse);
+    result.c = c.values();
+    result.fit = fit.values();
+    return result;
+}
+
+TEST(LinearFits, RevisionsKeepTheDigitsOfNISTsSets) {
+    // What is certified is of the decimal data, of which Norris, Pontius and Wampler2 lose digits in
+    // binary; so do the powers of Filip as a matrix.
+    const std::map<std::string, double> bounds = {{"Norris", 2e-14},
+                                                  {"Pontius", 1e-13},
+                                                  {"Filip", 5e-8},
+                                                  {"Longley", 5e-15},
+                                                  {"Wampler2", 2e-13}};
+    for (const auto &named : ReferenceSets()) {
+        const ReferenceSet &set = named.second;
+        SCOPED_TRACE(named.first);
+        const double bound = bounds.count(named.first) != 0 ? bounds.at(named.first) : 1e-15;
+        const GeneralFit general = FitRefined(set.rows, set.y, {}, -1.0);
+        ASSERT_EQ(general.code, 0);
+        EXPECT_LE(ErrorOf(general.c, set.c), bound);
+        const auto n = static_cast<double>(set.y.size());
+        EXPECT_NEAR(general.mse * n, set.squares, 1e-8 * set.squares + 1e-20);
+        Samples deviations;
+        for (std::size_t j = 0; j < set.c.size(); ++j)
+            deviations.push_back(std::sqrt(general.covariance[j][j] * set.squares /
+                                           (n - static_cast<double>(set.c.size()))));
+        EXPECT_LT(ErrorOf(deviations, set.deviations), 2e-8);
+        if (!set.isPolynomial)
+            continue;
+        const auto order = static_cast<int32_t>(set.c.size()) - 1;
+        const PolynomialFit found = FitPowersRefined(set.x, set.y, order);
+        ASSERT_EQ(found.code, 0);
+        EXPECT_LE(ErrorOf(found.c, set.c), named.first == "Filip" ? 1e-14 : bound);
+        EXPECT_NEAR(found.mse * n, set.squares, 1e-13 * set.squares + 1e-20);
+    }
+}
+
+TEST(LinearFits, RevisionsSolveProblemsOfAnySize) {
+    for (const auto &sizes : {std::pair(3, 3), std::pair(1537, 1), std::pair(300, 60)}) {
+        const Problem problem = RandomProblem(sizes.first, sizes.second, 31);
+        const Solution exact = SolveNormal(problem.rows, problem.y, problem.w);
+        // Rows, weights and targets of sizes at which squares overflow or vanish.
+        for (const auto &scales : {std::pair(0, 0), std::pair(-400, 380), std::pair(420, -440)}) {
+            SCOPED_TRACE(std::to_string(sizes.first) + " " + std::to_string(scales.first));
+            Problem scaled = problem;
+            for (Samples &row : scaled.rows)
+                for (std::size_t j = 0; j < row.size(); ++j)
+                    row[j] = std::ldexp(row[j], j % 2 == 0 ? scales.first : scales.second);
+            for (std::size_t i = 0; i < scaled.y.size(); ++i) {
+                scaled.y[i] = std::ldexp(scaled.y[i], scales.first / 9);
+                scaled.w[i] = std::ldexp(scaled.w[i], scales.second / 9);
+            }
+            const GeneralFit found = FitRefined(scaled.rows, scaled.y, scaled.w, -1.0);
+            ASSERT_EQ(found.code, 0);
+            for (std::size_t j = 0; j < exact.c.size(); ++j) {
+                const int size = j % 2 == 0 ? scales.first : scales.second;
+                EXPECT_LT(
+                    RelativeError(std::ldexp(found.c[j], size - scales.first / 9), exact.c[j]),
+                    1e-14);
+                EXPECT_LT(
+                    RelativeError(std::ldexp(found.covariance[j][j], 2 * size + scales.second / 9),
+                                  exact.covariance[j][j]),
+                    1e-12);
+            }
+        }
+    }
+    Problem low = RandomProblem(30, 3, 8);
+    for (Samples &row : low.rows)
+        row[2] = 2.0 * row[0];
+    const GeneralFit shortest = FitRefined(low.rows, low.y, {}, -1.0);
+    EXPECT_EQ(shortest.code, WarnRankDeficient);
+    Rows two = low.rows;
+    for (Samples &row : two)
+        row.pop_back();
+    const Solution exact = SolveNormal(two, low.y, {});
+    EXPECT_LT(RelativeError(shortest.c[0] + 2.0 * shortest.c[2], exact.c[0]), 1e-14);
+    EXPECT_LT(RelativeError(shortest.c[1], exact.c[1]), 1e-14);
+    low.rows[4][1] = infinity;
+    EXPECT_EQ(FitRefined(low.rows, low.y, {}, -1.0).code, ErrNonFiniteInput);
+}
+
+TEST(LinearFits, RevisedPolynomialsAreExact) {
+    // Integers, so that the data hold the polynomial exactly. Far from 0 the constant is what is left of
+    // terms that are 4e12 times as large.
+    for (const double middle : {0.0, 1000.0}) {
+        Samples x, y;
+        for (int i = -40; i <= 40; ++i) {
+            const Long t = middle + i;
+            x.push_back(static_cast<double>(t));
+            y.push_back(static_cast<double>(3 - t + 2 * t * t + t * t * t - 4 * t * t * t * t));
+        }
+        const Samples truth = {3, -1, 2, 1, -4, 0};
+        const PolynomialFit found = FitPowersRefined(x, y, 5);
+        EXPECT_EQ(found.code, 0);
+        for (int j = 0; j < 6; ++j)
+            EXPECT_NEAR(found.c[j], truth[j],
+                        truth[j] == 0.0 ? 1e-20
+                        : middle == 0.0 ? 1e-15
+                                        : 1e-13)
+                << middle << " " << j;
+        EXPECT_EQ(found.fit, y);
+        const PolynomialFit fixed = FitPowersRefined(x, y, 5, y, {0, 2, 9, 2}, {3, 7, 1, 2});
+        for (int j = 0; j < 5; ++j)
+            EXPECT_NEAR(fixed.c[j], truth[j], 1e-15 * std::fabs(truth[j])) << middle << " " << j;
+        const PolynomialFit given = FitPowersRefined(x, y, 1, {}, {0, 1}, {3, -1});
+        EXPECT_EQ(given.c, (Samples{3, -1}));
+        EXPECT_EQ(given.fit[0], static_cast<double>(3 - (Long{middle} - 40)));
+    }
+    // Extremes of x and y, order 50, and fewer abscissae than terms.
+    EXPECT_NEAR(FitPowersRefined({1e-300, 2e-300, 3e-300}, {1e-5, 4e-5, 9e-5}, 1).c[1] / 4e295, 1.0,
+                1e-14);
+    Samples x, y;
+    for (int i = 0; i <= 200; ++i) {
+        x.push_back(std::cos(0.005 * 3.14159265358979 * i));
+        y.push_back(std::exp(x[i]));
+    }
+    EXPECT_NEAR(FitPowersRefined(x, y, 50).fit[77], y[77], 1e-15);
+    EXPECT_EQ(FitPowersRefined(x, y, 51).code, ErrPolynomialOrderTooHigh);
+    const PolynomialFit twice = FitPowersRefined({1, 2, 1, 2}, {1, 3, 1, 3}, 2);
+    EXPECT_EQ(twice.code, WarnRankDeficient);
+    EXPECT_NEAR(twice.fit[1], 3.0, 1e-14);
+}
+
 TEST(LinearFits, MatricesOfLowRank) {
     Problem problem = RandomProblem(30, 3, 8);
     Rows twice = problem.rows, empty = problem.rows;

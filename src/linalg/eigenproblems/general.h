@@ -28,6 +28,14 @@ template <>
 ErrorCode EigenGeneral(const ConstComplexMatrix &a, ComplexVector values,
                        const ComplexMatrix &vectors);
 
+// The same by blocks from order fewestBlockedEigen on: reduction to Hessenberg form by blocks of
+// reflections, iterations with many shifts and early deflation (K. Braman, R. Byers and R. Mathias,
+// "The multishift QR algorithm", 2002), and vectors by products of matrices.
+constexpr int32_t fewestBlockedEigen = 160;
+template <ElementType E>
+ErrorCode EigenBlocked(const ConstMatrixView<E> &a, ComplexVector values,
+                       const ComplexMatrix &vectors);
+
 // The same of a Hermitian matrix, which is read from its lower triangle; the values ascend and have
 // no imaginary part.
 ErrorCode EigenHermitian(const ConstComplexMatrix &a, ComplexVector values,

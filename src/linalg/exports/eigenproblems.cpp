@@ -12,6 +12,8 @@ bool IsNoOutput(int32_t output) {
     return output != eigenValuesOnly && output != eigenValuesAndVectors;
 }
 
+enum class Steps { OneByOne, Blocked };
+template <Steps steps>
 Outcome Eigen(In<DBL2D> a, int32_t output, Out<CDB1D> values, Out<CDB2D> vectors) {
     if (const ErrorCode bad = SquareLast(a))
         return bad;
@@ -21,9 +23,12 @@ Outcome Eigen(In<DBL2D> a, int32_t output, Out<CDB1D> values, Out<CDB2D> vectors
         return bad;
     if (IsNoOutput(output))
         return ErrInvalidSelector;
-    return EigenGeneral<ElementType::DBL>(a.view(), values.view(), vectors.view());
+    const auto solve =
+        steps == Steps::Blocked ? EigenBlocked<ElementType::DBL> : EigenGeneral<ElementType::DBL>;
+    return solve(a.view(), values.view(), vectors.view());
 }
 
+template <Steps steps>
 Outcome CxEigen(In<CDB2D> a, int32_t matrixType, int32_t output, Out<CDB1D> values,
                 Out<CDB2D> vectors) {
     if (const ErrorCode bad = SquareLast(a))
@@ -36,7 +41,9 @@ Outcome CxEigen(In<CDB2D> a, int32_t matrixType, int32_t output, Out<CDB1D> valu
         return ErrInvalidSelector;
     if (matrixType == hermitianMatrix)
         return EigenHermitian(a.view(), values.view(), vectors.view());
-    return EigenGeneral<ElementType::CDB>(a.view(), values.view(), vectors.view());
+    const auto solve =
+        steps == Steps::Blocked ? EigenBlocked<ElementType::CDB> : EigenGeneral<ElementType::CDB>;
+    return solve(a.view(), values.view(), vectors.view());
 }
 
 Outcome SymEigen(InOut<DBL2D> a, int32_t output, Out<DBL1D> values) {
@@ -81,14 +88,23 @@ Outcome Schur2026(InOut<DBL2D> a, bool withVectors, int32_t order, Out<DBL2D> u,
 
 using qx::InErr;
 using qx::Returned;
+constexpr auto OneByOne = qx::Steps::OneByOne, Blocked = qx::Steps::Blocked;
 
 int32_t EigenValueVector_head(DBL2D a, const int32_t *output, CDB1D values, CDB2D vectors,
                               ErrorCode *err) {
-    return InErr(err, qx::Eigen, a, *output, values, vectors);
+    return InErr(err, qx::Eigen<OneByOne>, a, *output, values, vectors);
 }
 int32_t CxEigenValueVector_head(CDB2D a, const int32_t *matrixType, const int32_t *output,
                                 CDB1D values, CDB2D vectors, ErrorCode *err) {
-    return InErr(err, qx::CxEigen, a, *matrixType, *output, values, vectors);
+    return InErr(err, qx::CxEigen<OneByOne>, a, *matrixType, *output, values, vectors);
+}
+int32_t EigenValueVector2026_head(DBL2D a, const int32_t *output, CDB1D values, CDB2D vectors,
+                                  ErrorCode *err) {
+    return InErr(err, qx::Eigen<Blocked>, a, *output, values, vectors);
+}
+int32_t CxEigenValueVector2026_head(CDB2D a, const int32_t *matrixType, const int32_t *output,
+                                    CDB1D values, CDB2D vectors, ErrorCode *err) {
+    return InErr(err, qx::CxEigen<Blocked>, a, *matrixType, *output, values, vectors);
 }
 int32_t SymEvectorEvalue_head(DBL2D a, const int32_t *output, DBL1D values, ErrorCode *err) {
     return InErr(err, qx::SymEigen, a, *output, values);

@@ -142,7 +142,8 @@ void WritePermutation(ConstIndexVector pivots, const MatrixView<ElementType::I32
             permutation(i, j) = pivots[j] == i;
 }
 
-template <class Matrix>
+enum class Reflections { OneByOne, Blocked };
+template <class Matrix, Reflections reflections>
 Outcome QR(In<Matrix> a, bool pivoting, int32_t form, Out<I32_2D> permutation, Out<Matrix> q,
            Out<Matrix> r) {
     if (const ErrorCode bad = FirstFailed(
@@ -157,14 +158,16 @@ Outcome QR(In<Matrix> a, bool pivoting, int32_t form, Out<I32_2D> permutation, O
     if (const Outcome bad = r.resize(size, n))
         return bad;
     constexpr ElementType E = elementOf<Matrix>;
+    constexpr bool isBlocked = reflections == Reflections::Blocked;
     if (!pivoting)
-        return QRDecompose<E>(a.view(), QRForm{form}, q.view(), r.view());
+        return isBlocked ? QRDecomposeBlocked<E>(a.view(), QRForm{form}, {}, q.view(), r.view())
+                         : QRDecompose<E>(a.view(), QRForm{form}, q.view(), r.view());
     IndexVector pivots;
     ScratchParts memory;
     if (const ErrorCode failed = memory.take(Sized(pivots, n)))
         return failed;
-    if (const ErrorCode failed =
-            QRDecomposePivoted<E>(a.view(), QRForm{form}, pivots, q.view(), r.view()))
+    const auto decompose = isBlocked ? QRDecomposeBlocked<E> : QRDecomposePivoted<E>;
+    if (const ErrorCode failed = decompose(a.view(), QRForm{form}, pivots, q.view(), r.view()))
         return failed;
     WritePermutation(pivots, permutation.view());
     return 0;
@@ -320,6 +323,7 @@ Outcome VectorsBack(int32_t job, int32_t side, int32_t low, int32_t high, In<DBL
 
 using qx::InErr;
 using qx::Returned;
+constexpr auto OneByOne = qx::Reflections::OneByOne, Blocked = qx::Reflections::Blocked;
 constexpr auto LargeNorms = qx::SVDScaling::LargeNorms;
 constexpr auto Always = qx::SVDScaling::Always;
 
@@ -378,11 +382,20 @@ int32_t Cxqrd_head(CDB2D a, const int32_t *algorithm, CDB2D q, CDB2D r, ErrorCod
     return InErr(err, qx::QRByAlgorithm<CDB2D>, a, *algorithm, q, r);
 }
 ErrorCode QRDecH(DBL2D a, int32_t pivoting, int32_t economy, I32_2D permutation, DBL2D q, DBL2D r) {
-    return Returned(qx::QR<DBL2D>, a, pivoting != 0, economy, permutation, q, r);
+    return Returned(qx::QR<DBL2D, OneByOne>, a, pivoting != 0, economy, permutation, q, r);
 }
 ErrorCode CxQRDecH(CDB2D a, int32_t pivoting, int32_t economy, I32_2D permutation, CDB2D q,
                    CDB2D r) {
-    return Returned(qx::QR<CDB2D>, a, pivoting != 0, economy, permutation, q, r);
+    return Returned(qx::QR<CDB2D, OneByOne>, a, pivoting != 0, economy, permutation, q, r);
+}
+
+ErrorCode QRDec2026H(DBL2D a, int32_t pivoting, int32_t economy, I32_2D permutation, DBL2D q,
+                     DBL2D r) {
+    return Returned(qx::QR<DBL2D, Blocked>, a, pivoting != 0, economy, permutation, q, r);
+}
+ErrorCode CxQRDec2026H(CDB2D a, int32_t pivoting, int32_t economy, I32_2D permutation, CDB2D q,
+                       CDB2D r) {
+    return Returned(qx::QR<CDB2D, Blocked>, a, pivoting != 0, economy, permutation, q, r);
 }
 
 int32_t SVD_head(DBL2D a, DBL1D s, DBL2D v, ErrorCode *err) {

@@ -23,6 +23,15 @@ template <ElementType E>
 ErrorCode QRDecomposePivoted(const ConstMatrixView<E> &a, QRForm form, IndexVector pivots,
                              const MatrixView<E> &q, const MatrixView<E> &r);
 
+// The same by blocks of reflections (R. Schreiber and C. F. Van Loan, "A storage-efficient WY
+// representation for products of Householder transformations", 1989) where min(m, n) is at least
+// fewestBlocked, and as above below it. Pivots may be empty, then columns keep their order. What
+// overflows is infinite or NaN.
+constexpr int32_t fewestBlocked = 160;
+template <ElementType E>
+ErrorCode QRDecomposeBlocked(const ConstMatrixView<E> &a, QRForm form, IndexVector pivots,
+                             const MatrixView<E> &q, const MatrixView<E> &r);
+
 // Full q and r by Gram-Schmidt orthogonalisation, each projection made twice: q is then unitary to
 // a small multiple of m eps also where the columns nearly depend on each other (L. Giraud, J.
 // Langou, M. Rozloznik, "On the loss of orthogonality in the Gram-Schmidt orthogonalization

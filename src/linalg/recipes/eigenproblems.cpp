@@ -59,6 +59,25 @@ std::vector<Recipe> EigenproblemRecipes() {
                                                     c.out2D<CDB>(1), c.err());
                  },
                  None, sizes});
+        // Up to an order that is solved by blocks.
+        recipes.push_back({"EigenValueVector2026_head" + variant,
+                           [output](Call &c) {
+                               return EigenValueVector2026_head(
+                                   c.in2D<DBL>(0, c.n, c.n), c.byReference(output), c.out<CDB>(0),
+                                   c.out2D<CDB>(1), c.err());
+                           },
+                           None,
+                           {1, 7, 161}});
+        for (const int32_t type : {0, 1})
+            recipes.push_back(
+                {"CxEigenValueVector2026_head" + variant + ", type " + std::to_string(type),
+                 [output, type](Call &c) {
+                     return CxEigenValueVector2026_head(c.in2D<CDB>(0, c.n, c.n),
+                                                        c.byReference(type), c.byReference(output),
+                                                        c.out<CDB>(0), c.out2D<CDB>(1), c.err());
+                 },
+                 None,
+                 type == 0 ? std::vector<int32_t>{1, 7, 161} : std::vector<int32_t>{1, 3, 7}});
         recipes.push_back({"SymEvectorEvalue_head" + variant,
                            [output](Call &c) {
                                return SymEvectorEvalue_head(c.inOut2D<DBL>(0, c.n, c.n),

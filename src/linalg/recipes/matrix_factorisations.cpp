@@ -177,6 +177,11 @@ std::vector<Recipe> FactorisationRecipes() {
         for (const int32_t pivoting : {0, 1}) {
             recipes.push_back(QR<DBL>("QRDecH", pivoting, selector, QRDecH));
             recipes.push_back(QR<CDB>("CxQRDecH", pivoting, selector, CxQRDecH));
+            for (Recipe blocked : {QR<DBL>("QRDec2026H", pivoting, selector, QRDec2026H),
+                                   QR<CDB>("CxQRDec2026H", pivoting, selector, CxQRDec2026H)}) {
+                blocked.sizes = {1, 3, 161}; // up to an order that is factored by blocks
+                recipes.push_back(blocked);
+            }
         }
     }
     for (const int32_t job : {0, 1, 2, 3}) {

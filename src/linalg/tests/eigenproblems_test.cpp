@@ -31,18 +31,23 @@ using qx::test::MatrixKinds;
 using qx::test::RealMatrix;
 using qx::test::View;
 
-template <class Elements>
-void ExpectEigenproblemSolved(const Elements &a, int n) {
+template <class Elements, class Solver>
+void ExpectEigenproblemSolvedBy(Solver solve, const Elements &a, int n) {
     constexpr qx::ElementType E = elementIn<Elements>;
     std::vector<CDB> w(n), v(n * n), alone(n);
-    ASSERT_EQ(qx::EigenGeneral<E>(View(a, n, n), View(w), View(v, n, n)), 0);
+    ASSERT_EQ(solve(View(a, n, n), View(w), View(v, n, n)), 0);
     ExpectEigenpairs(a, n, w, v);
-    ASSERT_EQ(qx::EigenGeneral<E>(View(a, n, n), View(alone)), 0);
+    ASSERT_EQ(solve(View(a, n, n), View(alone), {}), 0);
     for (int i = 0; E == qx::ElementType::DBL && i < n; ++i) {
         const bool lower = i > 0 && w[i].im < 0.0;
         EXPECT_EQ(w[i].im, lower ? -w[i - 1].im : std::abs(w[i].im)) << i;
     }
 }
+template <class Elements>
+void ExpectEigenproblemSolved(const Elements &a, int n) {
+    ExpectEigenproblemSolvedBy(qx::EigenGeneral<elementIn<Elements>>, a, n);
+}
+
 TEST(EigenGeneral, PairsSatisfyTheirEquation) {
     for (const int n : {1, 2, 3, 4, 7, 20, 50})
         for (const MatrixKind &kind : MatrixKinds()) {
@@ -50,6 +55,41 @@ TEST(EigenGeneral, PairsSatisfyTheirEquation) {
             ExpectEigenproblemSolved(RealMatrix(kind, n, n), n);
             ExpectEigenproblemSolved(ComplexMatrix(kind, n, n), n);
         }
+}
+
+TEST(EigenGeneral, BlocksSolveLargeProblems) {
+    for (const char *name : {"random", "Frank"})
+        for (const MatrixKind &kind : MatrixKinds()) {
+            if (kind.name != std::string(name))
+                continue;
+            for (const int n : {159, 170}) {
+                SCOPED_TRACE(testing::Message() << name << ", order " << n);
+                const auto real = RealMatrix(kind, n, n);
+                const auto complex = ComplexMatrix(kind, n, n);
+                ExpectEigenproblemSolvedBy(qx::EigenBlocked<qx::ElementType::DBL>, real, n);
+                ExpectEigenproblemSolvedBy(qx::EigenBlocked<qx::ElementType::CDB>, complex, n);
+            }
+        }
+    // Extreme sizes, and an element that is not finite.
+    const int n = 160;
+    std::vector<double> a(n * n);
+    for (const double size : {1e-300, 1e300}) {
+        for (int i = 0; i < n * n; ++i)
+            a[i] = i % n <= i / n ? size * (1 + i / n) : 0.0; // lower triangle
+        std::vector<CDB> w(n), v(n * n);
+        ASSERT_EQ(qx::EigenBlocked<qx::ElementType::DBL>(View(a, n, n), View(w), View(v, n, n)), 0);
+        double sum = 0.0, largest = 0.0;
+        for (const CDB &value : w) {
+            sum += value.re / size;
+            largest = std::max(largest, static_cast<double>(value.re));
+        }
+        EXPECT_NEAR(sum / (n * (n + 1) / 2), 1.0, 1e-12);
+        EXPECT_NEAR(largest / (n * size), 1.0, 1e-12);
+    }
+    a[3] = std::numeric_limits<double>::infinity();
+    std::vector<CDB> w(n);
+    EXPECT_EQ(qx::EigenBlocked<qx::ElementType::DBL>(View(a, n, n), View(w), {}),
+              ErrNonFiniteInput);
 }
 
 // The lower triangle counts.

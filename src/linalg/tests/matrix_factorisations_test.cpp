@@ -176,6 +176,65 @@ TEST(QRDecomposition, TakesTheLongestColumnFirst) {
     });
 }
 
+const MatrixKind &Kind(const char *name) {
+    for (const MatrixKind &kind : MatrixKinds())
+        if (kind.name == std::string(name))
+            return kind;
+    throw std::out_of_range(name);
+}
+
+template <class Elements>
+void ExpectBlockedQR(const Elements &a, int m, int n, qx::QRForm form, bool pivoting) {
+    constexpr qx::ElementType E = elementIn<Elements>;
+    const int size = form == qx::qrFull ? m : std::min(m, n);
+    Elements q(m * size), r(size * n);
+    std::vector<int32_t> pivots(pivoting ? n : 0);
+    ASSERT_EQ(qx::QRDecomposeBlocked<E>(View(a, m, n), form, View(pivots), View(q, m, size),
+                                        View(r, size, n)),
+              0);
+    const Exact A(m, n, a.data()), Q(m, size, q.data()), R(size, n, r.data());
+    Exact permuted(m, n);
+    for (int i = 0; i < m; ++i)
+        for (int j = 0; j < n; ++j)
+            permuted(i, j) = A(i, pivoting ? pivots[j] : j);
+    EXPECT_EQ(R.below(), 0.0);
+    EXPECT_LT(Deviation(Q * R, permuted), 4.0);
+    EXPECT_LT(FromUnitary(Q), 8.0);
+    for (int i = 0; i < std::min(m, n); ++i) {
+        EXPECT_EQ(R(i, i).imag(), 0.0L);
+        if (pivoting && i > 0) {
+            EXPECT_LE(std::abs(R(i, i)), std::abs(R(i - 1, i - 1)) * (1.0L + 1e-7L)) << i;
+        }
+    }
+}
+
+TEST(QRDecomposition, BlocksFactorLargeMatrices) {
+    for (const auto &sizes : {std::pair(170, 161), std::pair(160, 175)})
+        for (const bool pivoting : {false, true})
+            for (const qx::QRForm form : {qx::qrFull, qx::qrEconomical}) {
+                SCOPED_TRACE(testing::Message() << sizes.first << pivoting << form);
+                const int m = sizes.first, n = sizes.second;
+                auto real = RealMatrix(Kind("random"), m, n);
+                ExpectBlockedQR(real, m, n, form, pivoting);
+                ExpectBlockedQR(ComplexMatrix(Kind("random"), m, n), m, n, form, pivoting);
+                for (const double size : {0x1p-1015, 0x1p1016}) { // products leave the range
+                    auto scaled = real;
+                    for (double &element : scaled)
+                        element *= size;
+                    std::vector<double> q(m * m), r(m * n), same(m * n);
+                    ASSERT_EQ(
+                        qx::QRDecomposeBlocked<qx::ElementType::DBL>(
+                            View(real, m, n), qx::qrFull, {}, View(q, m, m), View(same, m, n)),
+                        0);
+                    ASSERT_EQ(qx::QRDecomposeBlocked<qx::ElementType::DBL>(
+                                  View(scaled, m, n), qx::qrFull, {}, View(q, m, m), View(r, m, n)),
+                              0);
+                    for (int i = 0; i < m * n; i += 97)
+                        EXPECT_NEAR(r[i] / size, same[i], 1e-13);
+                }
+            }
+}
+
 TEST(QRDecomposition, GramSchmidtStaysUnitaryOnDependentColumns) {
     ForEveryMatrix([](const auto &a, int m, int n) {
         typedef std::decay_t<decltype(a)> Elements;
@@ -192,13 +251,6 @@ TEST(QRDecomposition, GramSchmidtStaysUnitaryOnDependentColumns) {
                 EXPECT_GE(R(i, i).real(), 0.0L);
         }
     });
-}
-
-const MatrixKind &Kind(const char *name) {
-    for (const MatrixKind &kind : MatrixKinds())
-        if (kind.name == std::string(name))
-            return kind;
-    throw std::out_of_range(name);
 }
 
 template <class Elements, class Export>

@@ -271,6 +271,16 @@ TEST(DistributionTails, ReachLimitsOfTheDegrees) {
     EXPECT_NEAR(Revised("it", {1e-200, 1.0}, 1), 1e200 / std::numbers::pi, 4e200 * eps);
     EXPECT_EQ(Revised("it", {1e-300, 0.5}, 1), inf);
     EXPECT_EQ(Revised("ichi2", {1e-300, 0.01}, 0), 0);
+    // Few degrees of one or both of Fisher's, against 700 digits (mpmath).
+    const double few[][5] = {{1e-200, 1e-305, 1e-305, 0.5, 0.5},
+                             {1e-200, 1e-305, 3.0, 1.0, 5.8164518930589053322e-303},
+                             {2.5, 1e-100, 7.0, 1.0, 1.1480387820551947758e-98},
+                             {1e-5, 3.0, 1e-60, 6.3563543382230254642e-59, 1.0},
+                             {2.5, 1e-22, 1e-26, 9.9990000999900008999e-5, 0.9999000099990001}};
+    for (const auto &row : few)
+        for (const int32_t upper : {0, 1})
+            EXPECT_NEAR(Revised("f", {row[0], row[1], row[2]}, upper) / row[3 + upper], 1.0, 2e-15)
+                << row[1] << " " << row[2];
     // Hardly any degrees: all but nothing lies beyond the range.
     for (const double degrees : {1e-20, 1e-50, 1.5272285085778469e-158}) {
         EXPECT_EQ(Revised("t", {1e300, degrees}, 1), 0.5);

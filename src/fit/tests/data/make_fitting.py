@@ -45,10 +45,20 @@ def fit(kind, k, y, x, algorithm):
         return c, np.sqrt(np.diag(covariance) * scale), mse * len(y)
 
 
+def revised(kind, k, y, x):
+    """The same of GenLSFit2026_head and PolyFit2026_head."""
+    matrix = np.vander(x[:, 0], k, increasing=True) if kind == "polynomial" else x
+    c, _, covariance, mse = qx.call("GenLSFit2026_head", matrix, y, [], -1.0, 1)
+    squares = mse * len(y)
+    if kind == "polynomial":
+        _, c, mse = qx.call("PolyFit2026_head", x[:, 0], y, k - 1, [], -1.0, [], [])
+    return c, np.sqrt(np.diag(covariance) * squares / (len(y) - k)), mse * len(y)
+
+
 def main():
     used = [(i, name) for i, name in enumerate(METHODS) if name]
-    print("| Set | Terms | " + " | ".join(name for _, name in used) + " | LAPACK |")
-    print("|---|---|" + "---|" * (len(used) + 1))
+    print("| Set | Terms | " + " | ".join(name for _, name in used) + " | revision | LAPACK |")
+    print("|---|---|" + "---|" * (len(used) + 2))
     for name, kind, exact, deviations, squares, y, x in sets():
         k = len(exact)
         cells = []
@@ -57,6 +67,8 @@ def main():
             pairs = zip(found, (exact, deviations, squares)) if found else ()
             cells.append(" / ".join(digits(*pair) for pair in pairs) or "refused")
         matrix = np.vander(x[:, 0], k, increasing=True) if kind == "polynomial" else x
+        pairs = zip(revised(kind, k, y, x), (exact, deviations, squares))
+        cells.append(" / ".join(digits(*pair) for pair in pairs))
         cells.append(digits(np.linalg.lstsq(matrix, y, rcond=0)[0], exact))
         print(f"| {name} | {k} | " + " | ".join(cells) + " |")
     _, _, exact, _, squares, y, x = next(sets())
