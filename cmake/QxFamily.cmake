@@ -2,6 +2,7 @@
 #           LANES convolve_lanes.cpp ...      inner routines written over lanes: once per width
 #                                             (frame/widths.h)
 #           WIDE_LANES product_lanes.cpp ...  such routines that gain by eight lanes as well
+#           EIGHT_LANES wide_product.cpp ...  routines of eight lanes alone, which the others choose
 #           EXPORTS exports/basic.cpp ...     frames, into the module
 #           TESTS tests/basic_test.cpp ...    one test program <family>_test
 #           RECIPES recipes/basic.cpp ...     how the conformance tests call the exports
@@ -11,7 +12,7 @@
 # The family is the folder that says so. A source in the folder that stands in no list fails the
 # configuration, as a listed one that does not exist does; so nothing is skipped without a word.
 function(qx_family)
-    cmake_parse_arguments(F "" "" "CORE;LANES;WIDE_LANES;EXPORTS;TESTS;RECIPES;UNLISTED" ${ARGN})
+    cmake_parse_arguments(F "" "" "CORE;LANES;WIDE_LANES;EIGHT_LANES;EXPORTS;TESTS;RECIPES;UNLISTED" ${ARGN})
     if(F_UNPARSED_ARGUMENTS)
         message(FATAL_ERROR "qx_family: ${F_UNPARSED_ARGUMENTS} belongs to no list")
     endif()
@@ -19,7 +20,8 @@ function(qx_family)
     file(GLOB_RECURSE found CONFIGURE_DEPENDS RELATIVE ${CMAKE_CURRENT_SOURCE_DIR} *.cpp)
     foreach(source IN LISTS found)
         if(NOT source IN_LIST F_CORE AND NOT source IN_LIST F_LANES
-            AND NOT source IN_LIST F_WIDE_LANES AND NOT source IN_LIST F_EXPORTS
+            AND NOT source IN_LIST F_WIDE_LANES AND NOT source IN_LIST F_EIGHT_LANES
+            AND NOT source IN_LIST F_EXPORTS
             AND NOT source IN_LIST F_TESTS AND NOT source IN_LIST F_RECIPES
             AND NOT source IN_LIST F_UNLISTED)
             message(FATAL_ERROR "${CMAKE_CURRENT_SOURCE_DIR}/${source} stands in no list of its family")
@@ -30,14 +32,16 @@ function(qx_family)
     list(TRANSFORM F_WIDE_LANES PREPEND ${CMAKE_CURRENT_SOURCE_DIR}/ REGEX "^[^/]+(/[^/]+)*$")
     list(TRANSFORM F_LANES PREPEND ${CMAKE_CURRENT_SOURCE_DIR}/ REGEX "^[^/]+(/[^/]+)*$")
     list(APPEND F_LANES ${F_WIDE_LANES})
+    list(TRANSFORM F_EIGHT_LANES PREPEND ${CMAKE_CURRENT_SOURCE_DIR}/ REGEX "^[^/]+(/[^/]+)*$")
+    list(APPEND F_EIGHT_LANES ${F_WIDE_LANES})
     list(TRANSFORM F_EXPORTS PREPEND ${CMAKE_CURRENT_SOURCE_DIR}/)
     list(TRANSFORM F_RECIPES PREPEND ${CMAKE_CURRENT_SOURCE_DIR}/)
     target_sources(qxcore PRIVATE ${F_CORE} ${F_LANES})
     if(F_LANES AND QX_AVX2)
         qx_compile_for_avx2(${family} ${F_LANES})
     endif()
-    if(F_WIDE_LANES AND QX_EIGHT_LANES)
-        qx_compile_for_avx512(${family} ${F_WIDE_LANES})
+    if(F_EIGHT_LANES AND QX_EIGHT_LANES)
+        qx_compile_for_avx512(${family} ${F_EIGHT_LANES})
     endif()
     target_sources(qxanalysis PRIVATE ${F_EXPORTS})
     if(QX_TESTS)
@@ -47,7 +51,7 @@ function(qx_family)
             if(F_LANES)
                 qx_run_at_width(${family}_test 2)
             endif()
-            if(F_WIDE_LANES AND QX_EIGHT_LANES)
+            if(F_EIGHT_LANES AND QX_EIGHT_LANES)
                 qx_run_at_width(${family}_test 4)
             endif()
         endif()

@@ -73,7 +73,7 @@ struct RealData {
             return PrimeRealTwiddle(PrimeAt(plan, level), out, outStride, m, work);
         const FFTStage &stage = *plan.stages[level];
         if (outStride == 1)
-            stage.kernels->realLanesTwiddle(out, m, out, stage, m);
+            stage.passes.realTwiddle(out, m, out, stage, m);
         else
             plan.realTwiddle[level](out, stage.twiddleCos, stage.twiddleSin, outStride, m);
     }
@@ -109,13 +109,13 @@ struct Bundle {
 struct ComplexLanesPath {
     static constexpr ptrdiff_t width = 2; // DBL units of one value
     static bool gainsByBuffer(int32_t, int32_t) { return true; }
-    static void leaf(const KernelSet &kernels, const DBL *in, DBL *out,
+    static void leaf(const LanesPasses &passes, const DBL *in, DBL *out,
                      const LeafColumns &columns) {
-        kernels.complexLanesLeaf(in, out, columns);
+        passes.complexLeaf(in, out, columns);
     }
     static void twiddle(const FFTStage &stage, const DBL *in, ptrdiff_t inLeg, DBL *out,
                         int32_t m) {
-        stage.kernels->complexLanesTwiddle(in, inLeg, out, stage, m);
+        stage.passes.complexTwiddle(in, inLeg, out, stage, m);
     }
     static void primeTwiddle(const PrimeFactor &factor, DBL *out, int32_t m, DBL *work) {
         PrimeComplexTwiddle(factor, out, out + 1, 2, m, work);
@@ -126,13 +126,13 @@ struct RealLanesPath {
     // Only where the columns are copied in any case. Two places double the addresses of a stage,
     // which reads from two ends of each block: 10^3 to 10^5 took 1.15 to 1.3 times as long.
     static bool gainsByBuffer(int32_t p, int32_t m) { return p > 4 && m % 256 == 0; }
-    static void leaf(const KernelSet &kernels, const DBL *in, DBL *out,
+    static void leaf(const LanesPasses &passes, const DBL *in, DBL *out,
                      const LeafColumns &columns) {
-        kernels.realLanesLeaf(in, out, columns);
+        passes.realLeaf(in, out, columns);
     }
     static void twiddle(const FFTStage &stage, const DBL *in, ptrdiff_t inLeg, DBL *out,
                         int32_t m) {
-        stage.kernels->realLanesTwiddle(in, inLeg, out, stage, m);
+        stage.passes.realTwiddle(in, inLeg, out, stage, m);
     }
     static void primeTwiddle(const PrimeFactor &factor, DBL *out, int32_t m, DBL *work) {
         PrimeRealTwiddle(factor, out, 1, m, work);
@@ -156,11 +156,11 @@ void RecurseLanes(const FFTPlan &plan, int32_t level, int32_t n, const DBL *in, 
     DBL *const blocks = buffered ? memory.buffer : out;
     const ptrdiff_t nextBlocks = buffered ? p * block : bundle.outStride;
     if (level == plan.factorCount - 2) {
-        const KernelSet &kernels = *plan.stages[level + 1]->kernels;
+        const LanesPasses &passes = plan.stages[level + 1]->passes;
         if (bundle.count == 1)
-            Path::leaf(kernels, in, blocks, {{p, 1}, {inStride, 0}, {block, 0}, p * inStride});
+            Path::leaf(passes, in, blocks, {{p, 1}, {inStride, 0}, {block, 0}, p * inStride});
         else
-            Path::leaf(kernels, in, blocks,
+            Path::leaf(passes, in, blocks,
                        {{bundle.count, p},
                         {bundle.inStride, inStride},
                         {nextBlocks, block},
@@ -323,6 +323,17 @@ void ExecuteReal(const FFTPlan &plan, const DBL *in, DBL *out, ptrdiff_t inStrid
     if (outStride == 1 && LeafHasKernels(plan))
         return RunLanes<RealLanesPath>(plan, in, out, inStride, work);
     Recurse(plan, 0, plan.length, data);
+}
+
+bool ExecuteComplexColumns(const FFTPlan &plan, const DBL *in, ptrdiff_t inPitch, DBL *out,
+                           ptrdiff_t outPitch, ptrdiff_t count, DBL *work) {
+    if (plan.whole.complex != nullptr || plan.factorCount < 2 || !LeafHasKernels(plan))
+        return false;
+    for (ptrdiff_t c = 0; c < count; c += leafBundle)
+        RecurseLanes<ComplexLanesPath>(
+            plan, 0, plan.length, in + 2 * c, out + 2 * c * outPitch, 2 * inPitch,
+            {std::min<ptrdiff_t>(leafBundle, count - c), 2, 2 * outPitch}, {work, nullptr});
+    return true;
 }
 
 ErrorCode FFTComplexForward(const FFTPlan *plan, const DBL *inRe, const DBL *inIm, DBL *outRe,

@@ -117,8 +117,8 @@ bool BuildTwiddles(FFTStage *stage, int32_t p, int32_t n) {
 }
 
 bool BuildLanes(FFTStage *stage, int32_t p, int32_t m) {
-    if (!Allocate(stage->complexLanes, ComplexLanesSize(p, m)) ||
-        !Allocate(stage->realLanes, RealLanesSize(p, m)))
+    if (!Allocate(stage->complexLanes, ComplexLanesSize(stage->passes, p, m)) ||
+        !Allocate(stage->realLanes, RealLanesSize(stage->passes, p, m)))
         return false;
     FillComplexLanes(*stage, p, m, stage->complexLanes);
     FillRealLanes(*stage, p, m, stage->realLanes);
@@ -233,7 +233,7 @@ bool BuildRader(FFTStage *stage, int32_t p) {
 bool BuildStage(FFTStage *stage, int32_t p, int32_t kind, int32_t n) {
     const bool isLeaf = n == p;
     if (kind == KernelFactor)
-        stage->kernels = KernelsOf(p);
+        stage->passes = PassesOf(p, isLeaf ? 0 : n / p);
     return (isLeaf || BuildTwiddles(stage, p, n)) &&
            (isLeaf || kind != KernelFactor || BuildLanes(stage, p, n / p)) &&
            (kind != DirectPrime || BuildRoots(stage, p)) &&

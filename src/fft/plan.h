@@ -10,6 +10,8 @@
 #include <cstddef>
 #include <cstdint>
 
+struct FFTStage;
+
 namespace qx {
 
 // Kernels of one radix p. Strides count in DBL units; `count` and `m` are numbers of columns.
@@ -28,6 +30,29 @@ typedef void (*ComplexTwiddle)(DBL *re, DBL *im, const DBL *twiddleCos, const DB
                                std::ptrdiff_t stride, int32_t m);
 
 struct KernelSet;
+
+// The columns of a leaf: a rectangle of transforms, number (a, b) with its input at
+// a inStride[0] + b inStride[1] and its output at a outStride[0] + b outStride[1]. Value j of a
+// transform is j legStride behind its first.
+struct LeafColumns {
+    std::ptrdiff_t count[2];
+    std::ptrdiff_t inStride[2];
+    std::ptrdiff_t outStride[2];
+    std::ptrdiff_t legStride;
+};
+
+// The loops of one radix that run in SIMD lanes: complex data is interleaved, results lie side by
+// side, and twiddles come from tables in the order in which the lanes read them, blocks of so many
+// lanes at a time. All numbers of lanes give the same bits.
+struct LanesPasses {
+    void (*complexLeaf)(const DBL *in, DBL *out, const LeafColumns &columns);
+    void (*realLeaf)(const DBL *in, DBL *out, const LeafColumns &columns);
+    void (*complexTwiddle)(const DBL *in, std::ptrdiff_t inLeg, DBL *out, const FFTStage &stage,
+                           std::ptrdiff_t m);
+    void (*realTwiddle)(const DBL *in, std::ptrdiff_t inLeg, DBL *out, const FFTStage &stage,
+                        std::ptrdiff_t m);
+    int32_t complexLanes, realLanes;
+};
 
 // Straight-line transforms of one length, input and results side by side; null where there are
 // none.
@@ -57,9 +82,9 @@ struct FFTStage {
     FFTPlan *raderPlan;
     DBL *raderCos, *raderSin;
     int32_t *raderGather, *raderScatter;
-    // Factor with kernels: all of them, and for every stage but the last its twiddles once more, in
-    // the order in which the lanes of the complex and of the real kernels read them.
-    const qx::KernelSet *kernels;
+    // Factor with kernels: its loops in lanes, and for every stage but the last its twiddles once
+    // more, in the order in which these read them.
+    qx::LanesPasses passes;
     DBL *complexLanes, *realLanes;
 };
 

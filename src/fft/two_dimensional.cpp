@@ -1,6 +1,7 @@
 #include "fft/two_dimensional.h"
 
 #include "fft/column_block.h"
+#include "fft/execute.h"
 #include "fft/passes.h"
 #include "fft/shifted_order.h"
 #include "frame/heap_block.h"
@@ -122,9 +123,14 @@ ErrorCode ForwardColumns(const FFTPlan *plan, const ComplexBlock &matrix, int32_
         return failed;
     for (int32_t c = 0; c < cols; c += ColumnsAtOnce) {
         const int32_t count = ColumnsInBlock(c, cols);
-        GatherColumns<ElementType::CDB>(matrix.data() + c, PaddedPitch(cols), usedRows, count,
-                                        columns.data(), pitch);
-        for (int32_t i = 0; i < count; ++i)
+        const CDB *const first = matrix.data() + c;
+        const bool done = usedRows == rows &&
+                          ExecuteComplexColumns(*plan, &first->re, PaddedPitch(cols),
+                                                &results.data()->re, pitch, count, work);
+        if (!done)
+            GatherColumns<ElementType::CDB>(first, PaddedPitch(cols), usedRows, count,
+                                            columns.data(), pitch);
+        for (int32_t i = 0; i < count && !done; ++i)
             if (const ErrorCode failed = Forward(plan, columns.data() + i * pitch,
                                                  results.data() + i * pitch, rows, work))
                 return failed;

@@ -13,6 +13,9 @@ using std::ptrdiff_t;
 // Columns of packed complex values that stand in one Wide.
 constexpr int packedColumns = nativeLanes / 2;
 
+// Loops of eight lanes run where the columns fill them; those of four do the others.
+constexpr bool isWide = nativeLanes == 8;
+
 // ---- Columns copied to the stack ----
 //
 // Where the values of a column are a multiple of half a page apart, all of them fall into the same

@@ -45,6 +45,8 @@ RADICES = [2, 3, 4, 5, 7, 8, 9, 10, 11, 13, 14, 16, 17, 18, 19, 29, 31, 32, 37, 
 WHOLE = [6, 12, 15, 20, 24, 28, 30, 36, 40, 48]
 # Real transforms of these are complex ones of half the length; below 20 the direct ones are faster.
 BY_HALF = [n for n in range(20, 65, 2) if n // 2 in RADICES + WHOLE]
+# Radices with loops of eight lanes.
+WIDE = [3, 4, 5, 7, 8, 9, 10, 16, 32]
 # Composite length -> its factor r; coprime factors are recognised.
 SPLIT = {4: 2, 6: 2, 8: 2, 9: 3, 10: 2, 12: 3, 14: 2, 15: 3, 16: 4, 18: 2, 20: 4,
          24: 3, 28: 4, 30: 5, 32: 4, 36: 4, 40: 5, 48: 3}
@@ -458,13 +460,33 @@ def choice_file():
     return enclosed("The choice of kernels", [
         "const KernelSet *KernelsOf(int32_t radix) {\n    switch (radix) {",
         *kernels, "    default:\n        return nullptr;\n    }\n}\n",
+        "LanesPasses PassesOf(int32_t radix, int32_t) {\n    return KernelsOf(radix)->lanes;\n}\n",
         "WholeTransform WholeOf(int32_t length) {\n    switch (length) {",
         *wholes, "    default:\n        return {};\n    }\n}\n"])
 
 
-def enclosed(title, texts):
+def passes_file_of(p):
+    return enclosed(f"The loops of {p} in eight lanes", [
+        packed_text(p),
+        f"template <>\nvoid TakeWidePasses<{p}>(LanesPasses &passes) {{\n"
+        f"    passes.complexLeaf = ComplexLanesLeaf<{p}>;\n"
+        f"    passes.complexTwiddle = ComplexLanesTwiddle<{p}>;\n"
+        "    passes.complexLanes = nativeLanes;\n}\n"], "kernel_set")
+
+
+def passes_choice_file():
+    """Stages whose columns fill no eight lanes stay with four."""
+    cases = [f"    case {p}:\n        TakeWidePasses<{p}>(passes);\n        break;" for p in WIDE]
+    return enclosed("The choice of loops in eight lanes", [
+        "LanesPasses PassesOf(int32_t radix, int32_t m) {",
+        "    LanesPasses passes = avx2::PassesOf(radix, m);",
+        "    if (m % packedColumns != 0)\n        return passes;\n    switch (radix) {",
+        *cases, "    default:\n        break;\n    }\n    return passes;\n}\n"], "kernel_set")
+
+
+def enclosed(title, texts, header="whole"):
     return "\n".join([f"// {title}, made by fft/kernels/generate.py.\n",
-                      "#include \"fft/kernels/whole.h\"\n\nnamespace qx::QX_WIDTH {\n",
+                      f"#include \"fft/kernels/{header}.h\"\n\nnamespace qx::QX_WIDTH {{\n",
                       *texts, "} // namespace qx::QX_WIDTH\n"])
 
 
@@ -474,6 +496,9 @@ def main():
     for p in RADICES + WHOLE:
         (folder / f"kernels_{p}.cpp").write_text(file_of(p))
     (folder / "kernels_choice.cpp").write_text(choice_file())
+    for p in WIDE:
+        (folder / f"passes_{p}.cpp").write_text(passes_file_of(p))
+    (folder / "passes_choice.cpp").write_text(passes_choice_file())
 
 
 if __name__ == "__main__":

@@ -92,6 +92,17 @@ QX_INLINE void RunReal(const In &in, const Out &out) {
 
 // ---- Leaves ----
 
+// How many rows of a leaf are copied to the stack together, `leafBundle` neighbouring columns in all
+// of `width` DBL units each; 0 where they do not lie so.
+inline ptrdiff_t RowsTogether(const LeafColumns &columns, ptrdiff_t width) {
+    const ptrdiff_t count = columns.count[0];
+    if (columns.inStride[0] != width || leafBundle % count != 0)
+        return 0;
+    const ptrdiff_t rows = leafBundle / count;
+    const bool follow = rows == 1 || columns.inStride[1] == count * width;
+    return follow && columns.count[1] % rows == 0 ? rows : 0;
+}
+
 template <int P>
 __attribute__((noinline)) void ComplexLeafColumn(const ColumnIn &in, const ColumnOut &out) {
     RunPacked<P, One>(in, out);
@@ -115,7 +126,7 @@ __attribute__((noinline)) void ComplexLeafRows(const DBL *in, DBL *out,
                 column += nativeLanes;
             }
         }
-        for (; left > 0; --left) {
+        for (; !isWide && left > 0; --left) {
             ComplexLeafColumn<P>({column, column + 1, columns.legStride},
                                  {results, results + 1, 2});
             column += columns.inStride[0];
@@ -127,14 +138,20 @@ __attribute__((noinline)) void ComplexLeafRows(const DBL *in, DBL *out,
 template <int P>
 void ComplexLanesLeaf(const DBL *in, DBL *out, const LeafColumns &columns) {
     constexpr int width = 2 * leafBundle;
-    if (columns.count[0] != leafBundle || columns.inStride[0] != 2 ||
-        !legsCollide(columns.legStride, P)) {
+    if constexpr (isWide)
+        if (columns.inStride[0] != 2 || columns.count[0] % packedColumns != 0)
+            return avx2::KernelsOf(P)->lanes.complexLeaf(in, out, columns);
+    const ptrdiff_t together = legsCollide(columns.legStride, P) ? RowsTogether(columns, 2) : 0;
+    if (together == 0) {
         ComplexLeafRows<P>(in, out, columns);
         return;
     }
     double rows[P * width];
-    const LeafColumns onStack = {{leafBundle, 1}, {2, 0}, {columns.outStride[0], 0}, width};
-    for (ptrdiff_t b = 0; b < columns.count[1]; ++b) {
+    const LeafColumns onStack = {{columns.count[0], together},
+                                 {2, 2 * columns.count[0]},
+                                 {columns.outStride[0], columns.outStride[1]},
+                                 width};
+    for (ptrdiff_t b = 0; b < columns.count[1]; b += together) {
         CopyRows<width>(in + b * columns.inStride[1], columns.legStride, rows, width, P);
         ComplexLeafRows<P>(rows, out + b * columns.outStride[1], onStack);
     }
@@ -212,13 +229,17 @@ void RealLanesLeaf(const DBL *in, DBL *out, const LeafColumns &columns) {
         RealLeafWalk<P>(in, out, columns);
         return;
     }
-    if (columns.count[0] != leafBundle || !legsCollide(columns.legStride, P)) {
+    const ptrdiff_t together = legsCollide(columns.legStride, P) ? RowsTogether(columns, 1) : 0;
+    if (together == 0) {
         RealLeafRows<P>(in, out, columns);
         return;
     }
     double rows[P * leafBundle];
-    const LeafColumns onStack = {{leafBundle, 1}, {1, 0}, {columns.outStride[0], 0}, leafBundle};
-    for (ptrdiff_t b = 0; b < columns.count[1]; ++b) {
+    const LeafColumns onStack = {{columns.count[0], together},
+                                 {1, columns.count[0]},
+                                 {columns.outStride[0], columns.outStride[1]},
+                                 leafBundle};
+    for (ptrdiff_t b = 0; b < columns.count[1]; b += together) {
         CopyRows<leafBundle>(in + b * columns.inStride[1], columns.legStride, rows, leafBundle, P);
         RealLeafRows<P>(rows, out + b * columns.outStride[1], onStack);
     }
@@ -311,7 +332,7 @@ void ComplexLanesTwiddle(const DBL *in, ptrdiff_t inLeg, DBL *out, const FFTStag
     }
     const ptrdiff_t whole = m - m % packedColumns;
     ComplexTwiddleColumns<P>(in, inLeg, out, leg, whole, stage.complexLanes);
-    if (whole < m) {
+    if (!isWide && whole < m) {
         const ptrdiff_t entry = (whole - 1) * (P - 1);
         const DBL *const from = in + 2 * whole;
         DBL *const to = out + 2 * whole;
@@ -432,8 +453,12 @@ void RealLanesTwiddle(const DBL *in, ptrdiff_t inLeg, DBL *out, const FFTStage &
 
 template <int P>
 constexpr KernelSet MakeKernels() {
-    return {RealLeafKernel<P>, RealTwiddleKernel<P>, ComplexLeafKernel<P>, ComplexTwiddleKernel<P>,
-            RealLanesLeaf<P>,  RealLanesTwiddle<P>,  ComplexLanesLeaf<P>,  ComplexLanesTwiddle<P>};
+    return {RealLeafKernel<P>,
+            RealTwiddleKernel<P>,
+            ComplexLeafKernel<P>,
+            ComplexTwiddleKernel<P>,
+            {ComplexLanesLeaf<P>, RealLanesLeaf<P>, ComplexLanesTwiddle<P>, RealLanesTwiddle<P>,
+             nativeLanes, nativeLanes}};
 }
 
 } // namespace qx::QX_WIDTH

@@ -1,52 +1,48 @@
 #include "fft/kernels/kernels.h"
 
-#include "frame/lanes.h"
-
-namespace qx::QX_WIDTH {
-namespace {
+namespace qx {
 
 using std::ptrdiff_t;
 
-constexpr int packedColumns = nativeLanes / 2;
-
-} // namespace
-
-int64_t ComplexLanesSize(int32_t p, int32_t m) {
-    return int64_t{m / packedColumns} * nativeLanes * (p - 1);
+int64_t ComplexLanesSize(const LanesPasses &passes, int32_t p, int32_t m) {
+    return int64_t{m / (passes.complexLanes / 2)} * passes.complexLanes * (p - 1);
 }
 
-int64_t RealLanesSize(int32_t p, int32_t m) {
-    return int64_t{(m - 1) / 2 / nativeLanes} * nativeLanes * 2 * (p - 1);
+int64_t RealLanesSize(const LanesPasses &passes, int32_t p, int32_t m) {
+    return int64_t{(m - 1) / 2 / passes.realLanes} * passes.realLanes * 2 * (p - 1);
 }
 
-void FillComplexLanes(const FFTStage &stage, int32_t p, int32_t m, DBL *lanes) {
+void FillComplexLanes(const FFTStage &stage, int32_t p, int32_t m, DBL *table) {
+    const int lanes = stage.passes.complexLanes;
+    const int packedColumns = lanes / 2;
     const ptrdiff_t pitch = p - 1;
     for (ptrdiff_t block = 0; block + packedColumns <= m; block += packedColumns) {
         for (int column = 0; column < packedColumns; ++column) {
             const ptrdiff_t k = block + column;
             const ptrdiff_t entry = (k - 1) * pitch;
             for (ptrdiff_t j = 0; j < pitch; ++j) {
-                DBL *const packed = lanes + j * nativeLanes + 2 * column;
+                DBL *const packed = table + j * lanes + 2 * column;
                 packed[0] = k == 0 ? 1.0 : stage.twiddleCos[entry + j];
                 packed[1] = k == 0 ? 0.0 : stage.twiddleSin[entry + j];
             }
         }
-        lanes += pitch * nativeLanes;
+        table += pitch * lanes;
     }
 }
 
-void FillRealLanes(const FFTStage &stage, int32_t p, int32_t m, DBL *lanes) {
+void FillRealLanes(const FFTStage &stage, int32_t p, int32_t m, DBL *table) {
+    const int lanes = stage.passes.realLanes;
     const ptrdiff_t pitch = p - 1;
-    for (ptrdiff_t block = 1; block + nativeLanes - 1 <= (m - 1) / 2; block += nativeLanes) {
-        for (int lane = 0; lane < nativeLanes; ++lane) {
+    for (ptrdiff_t block = 1; block + lanes - 1 <= (m - 1) / 2; block += lanes) {
+        for (int lane = 0; lane < lanes; ++lane) {
             const ptrdiff_t entry = (block + lane - 1) * pitch;
             for (ptrdiff_t j = 0; j < pitch; ++j) {
-                lanes[2 * j * nativeLanes + lane] = stage.twiddleCos[entry + j];
-                lanes[(2 * j + 1) * nativeLanes + lane] = stage.twiddleSin[entry + j];
+                table[2 * j * lanes + lane] = stage.twiddleCos[entry + j];
+                table[(2 * j + 1) * lanes + lane] = stage.twiddleSin[entry + j];
             }
         }
-        lanes += 2 * pitch * nativeLanes;
+        table += 2 * pitch * lanes;
     }
 }
 
-} // namespace qx::QX_WIDTH
+} // namespace qx

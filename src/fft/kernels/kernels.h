@@ -12,44 +12,32 @@ namespace qx {
 constexpr int32_t kernelRadices[] = {10, 43, 41, 37, 32, 31, 29, 19, 18, 17, 16,
                                      14, 13, 11, 9,  8,  7,  5,  4,  3,  2};
 
-// The columns of a leaf: a rectangle of transforms, number (a, b) with its input at
-// a inStride[0] + b inStride[1] and its output at a outStride[0] + b outStride[1]. Value j of a
-// transform is j legStride behind its first.
-struct LeafColumns {
-    std::ptrdiff_t count[2];
-    std::ptrdiff_t inStride[2];
-    std::ptrdiff_t outStride[2];
-    std::ptrdiff_t legStride;
-};
-
 // So many transforms of neighbouring inputs run together where the length allows it.
 constexpr int leafBundle = 8;
 
-// The kernels of one radix. The first four take any strides. The others run in SIMD lanes: complex
-// data is interleaved, results lie side by side, and twiddles come from the lane tables. Both give
-// the same bits.
+// The kernels of one radix: four that take any strides, and the loops in lanes. Both give the same
+// bits.
 struct KernelSet {
     RealLeaf realLeaf;
     RealTwiddle realTwiddle;
     ComplexLeaf complexLeaf;
     ComplexTwiddle complexTwiddle;
-
-    void (*realLanesLeaf)(const DBL *in, DBL *out, const LeafColumns &columns);
-    void (*realLanesTwiddle)(const DBL *in, std::ptrdiff_t inLeg, DBL *out, const FFTStage &stage,
-                             std::ptrdiff_t m);
-    void (*complexLanesLeaf)(const DBL *in, DBL *out, const LeafColumns &columns);
-    void (*complexLanesTwiddle)(const DBL *in, std::ptrdiff_t inLeg, DBL *out,
-                                const FFTStage &stage, std::ptrdiff_t m);
+    LanesPasses lanes;
 };
 
-// The kernels of one of kernelRadices.
+// The kernels of one of kernelRadices, and its loops in as many lanes as are fastest for a stage of m
+// columns; 0 for the leaf.
 QX_BY_WIDTH(const KernelSet *, KernelsOf, (int32_t radix))
+QX_BY_WIDTH_TO_8(LanesPasses, PassesOf, (int32_t radix, int32_t m))
 // The transforms of one length in one call.
 QX_BY_WIDTH(WholeTransform, WholeOf, (int32_t length))
 
 namespace QX_WIDTH {
 template <int P>
 const KernelSet *KernelsFor();
+// The loops of complex data in eight lanes in the place of those of four.
+template <int P>
+void TakeWidePasses(LanesPasses &passes);
 // One transform, interleaved and side by side.
 template <int P>
 void ComplexSideBySide(const DBL *in, DBL *out);
@@ -62,10 +50,10 @@ void RealSideBySide(const DBL *in, DBL *out);
 // j from 1 to p - 1. The complex table starts at column 0 and has packed entries; the real one has
 // columns 1 to (m - 1) / 2, for the rest mirrors them, in an entry all cosines, then all sines.
 // Columns that fill no block are left out.
-QX_BY_WIDTH(int64_t, ComplexLanesSize, (int32_t p, int32_t m))
-QX_BY_WIDTH(int64_t, RealLanesSize, (int32_t p, int32_t m))
-QX_BY_WIDTH(void, FillComplexLanes, (const FFTStage &stage, int32_t p, int32_t m, DBL *lanes))
-QX_BY_WIDTH(void, FillRealLanes, (const FFTStage &stage, int32_t p, int32_t m, DBL *lanes))
+int64_t ComplexLanesSize(const LanesPasses &passes, int32_t p, int32_t m);
+int64_t RealLanesSize(const LanesPasses &passes, int32_t p, int32_t m);
+void FillComplexLanes(const FFTStage &stage, int32_t p, int32_t m, DBL *table);
+void FillRealLanes(const FFTStage &stage, int32_t p, int32_t m, DBL *table);
 
 } // namespace qx
 

@@ -56,7 +56,11 @@ QX_INLINE Lanes<N> Turned(Lanes<N> x, double c, double s) {
 // x times the packed w.
 template <int N>
 QX_INLINE Lanes<N> Twiddled(Lanes<N> x, Lanes<N> w) {
-    return MinusPlus(x * FirstsTwice(w), Swapped(x) * SecondsTwice(w));
+    // Eight lanes have no instruction that adds and subtracts by turns.
+    if constexpr (N == 8)
+        return x * FirstsTwice(w) + Swapped(x) * NegatedInPairs(SecondsTwice(w), true);
+    else
+        return MinusPlus(x * FirstsTwice(w), Swapped(x) * SecondsTwice(w));
 }
 
 } // namespace qx::QX_WIDTH
