@@ -109,12 +109,17 @@ private:
     int32_t opposites_; // the sum of the indices of two opposite columns
 };
 
+// The columns of a matrix of so many values, which the second cache holds, are read where they are; those of
+// larger ones are first copied, row by row.
+constexpr int64_t mostReadInPlace = 1 << 16;
+
 // Transforms the columns in matrix, which is row-major with `usedRows` rows, padded with zeros to
 // `rows` values. set(c, count, columns, pitch) takes them as they come.
 template <class Set>
 ErrorCode ForwardColumns(const FFTPlan *plan, const ComplexBlock &matrix, int32_t usedRows,
                          int32_t rows, int32_t cols, DBL *work, const Set &set) {
     const int64_t pitch = PaddedPitch(rows);
+    const bool readInPlace = usedRows == rows && int64_t{rows} * cols <= mostReadInPlace;
     ComplexBlock columns;
     ComplexBlock results;
     if (const ErrorCode failed = columns.allocateCleared(ColumnsAtOnce * pitch))
@@ -124,9 +129,9 @@ ErrorCode ForwardColumns(const FFTPlan *plan, const ComplexBlock &matrix, int32_
     for (int32_t c = 0; c < cols; c += ColumnsAtOnce) {
         const int32_t count = ColumnsInBlock(c, cols);
         const CDB *const first = matrix.data() + c;
-        const bool done = usedRows == rows &&
-                          ExecuteComplexColumns(*plan, &first->re, PaddedPitch(cols),
-                                                &results.data()->re, pitch, count, work);
+        const bool done =
+            readInPlace && ExecuteComplexColumns(*plan, &first->re, PaddedPitch(cols),
+                                                 &results.data()->re, pitch, count, work);
         if (!done)
             GatherColumns<ElementType::CDB>(first, PaddedPitch(cols), usedRows, count,
                                             columns.data(), pitch);

@@ -46,7 +46,7 @@ WHOLE = [6, 12, 15, 20, 24, 28, 30, 36, 40, 48]
 # Real transforms of these are complex ones of half the length; below 20 the direct ones are faster.
 BY_HALF = [n for n in range(20, 65, 2) if n // 2 in RADICES + WHOLE]
 # Radices with loops of eight lanes.
-WIDE = [3, 4, 5, 7, 8, 9, 10, 16, 32]
+WIDE = [4, 7, 8, 9, 10, 16, 32]
 # Composite length -> its factor r; coprime factors are recognised.
 SPLIT = {4: 2, 6: 2, 8: 2, 9: 3, 10: 2, 12: 3, 14: 2, 15: 3, 16: 4, 18: 2, 20: 4,
          24: 3, 28: 4, 30: 5, 32: 4, 36: 4, 40: 5, 48: 3}

@@ -138,9 +138,10 @@ __attribute__((noinline)) void ComplexLeafRows(const DBL *in, DBL *out,
 template <int P>
 void ComplexLanesLeaf(const DBL *in, DBL *out, const LeafColumns &columns) {
     constexpr int width = 2 * leafBundle;
-    if constexpr (isWide)
-        if (columns.inStride[0] != 2 || columns.count[0] % packedColumns != 0)
-            return avx2::KernelsOf(P)->lanes.complexLeaf(in, out, columns);
+#ifdef QX_HAS_EIGHT_LANES
+    if (isWide && (columns.inStride[0] != 2 || columns.count[0] % packedColumns != 0))
+        return avx2::KernelsOf(P)->lanes.complexLeaf(in, out, columns);
+#endif
     const ptrdiff_t together = legsCollide(columns.legStride, P) ? RowsTogether(columns, 2) : 0;
     if (together == 0) {
         ComplexLeafRows<P>(in, out, columns);
