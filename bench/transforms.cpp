@@ -40,10 +40,10 @@ void Compare(int32_t n, [[maybe_unused]] Totals &totals) {
     const HostMemory work(qx::DCTInverseWork(n));
     const qx::PlanReference plan(static_cast<int32_t>(qx::DCTPlanLength(n)));
     const auto forward = [&] {
-        qx::DCTForward(plan.get(), in.data(), n, out.data(), 1, 1, n, work.data());
+        qx::DCTForward(plan.get(), {in.data(), n}, {out.data(), n}, work.data());
     };
     const auto inverse = [&] {
-        qx::DCTInverse(in.data(), out.data(), 1, 1, n, work.data(), plan.get());
+        qx::DCTInverse(plan.get(), {in.data(), n}, {out.data(), n}, work.data());
     };
 #ifdef QX_PEER_FFTW3
     const FFTWPlan estimate = Peer(n, FFTW_REDFT10, FFTW_ESTIMATE);

@@ -31,9 +31,14 @@ QX_API int32_t CxMatrixExp_head(QX_INOUT CDB2D a, QX_OUT ErrorCode *err);
 /** exp(a) of the square matrix a by scaling, a Pade approximant of degree 3 to 13 and repeated
     squaring; of a diagonal matrix element by element. Degree and scaling follow from norms of powers
     of a, so that one large element costs no digits where powers of a are small; the backward error
-    of the approximant is below 2.2e-16. Norms may be of any size. Elements that overflow, and what is
-    computed from them, are infinite or NaN. A. H. Al-Mohy and N. J. Higham, "A new scaling and
-    squaring algorithm for the matrix exponential", 2009.
+    of the approximant is below 2.2e-16. A matrix of norm 2^53 or more is first brought to D^-1 a D
+    with the diagonal matrix D of powers of two that makes the largest element smallest, and the
+    exponential of that is brought back: elements of any size cost no digits where their products on
+    cycles are small, as in triangular matrices. Elements that D makes smaller than 2^-1074 count as
+    0. Where powers cancel instead, as those of (-x, -x; x, x), large matrices are ill-conditioned and
+    no digit may be right. Elements that overflow, and what is computed from them, are infinite or
+    NaN. A. H. Al-Mohy and N. J. Higham, "A new scaling and squaring algorithm for the matrix
+    exponential", 2009.
     Codes: ErrEmptyInput (a is empty), ErrNotSquare (a is not square), ErrOutOfMemory (no memory, or
     the host refuses the resize), ErrNonFiniteInput (an element is not finite).
     NaN: a refused with ErrNonFiniteInput. */

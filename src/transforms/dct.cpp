@@ -3,7 +3,7 @@
 #include "fft/quarter_wave.h"
 #include "frame/lanes.h"
 #include "transforms/dct_passes.h"
-#include "transforms/strided_window.h"
+#include "transforms/padded_input.h"
 
 #include <cmath>
 #include <cstddef>
@@ -20,19 +20,18 @@ typedef Lanes<2> Pair;
 // `Length` is the type of n: an integer, or one of fixed value that is transformed whole, for which
 // the compiler unrolls the loops and computes the scale.
 template <class Length>
-ErrorCode ForwardEven(const FFTPlan *plan, const DBL *x, std::ptrdiff_t inStride, DBL *out,
-                      std::ptrdiff_t outStride, Length n, DBL *work) {
+ErrorCode ForwardEven(const FFTPlan *plan, const DBL *x, DBL *out, Length n, DBL *work) {
     constexpr bool isLong = std::is_same_v<Length, int32_t>;
     const double scale = 2.0 / std::sqrt(2.0 * n);
     const double root = std::sqrt(static_cast<double>(n));
     DBL *const reordered = work;
     DBL *const h = work + n;
-    if (isLong && inStride == 1)
+    if (isLong)
         GatherEvenOdd(x, n, reordered);
     else
         for (std::ptrdiff_t j = 0; j < n / 2; ++j) {
-            reordered[j] = x[2 * j * inStride];
-            reordered[n - 1 - j] = x[(2 * j + 1) * inStride];
+            reordered[j] = x[2 * j];
+            reordered[n - 1 - j] = x[2 * j + 1];
         }
     if constexpr (!isLong)
         plan->whole.real(reordered, h);
@@ -43,7 +42,7 @@ ErrorCode ForwardEven(const FFTPlan *plan, const DBL *x, std::ptrdiff_t inStride
         return ErrOutOfMemory;
 
     out[0] = h[0] / root;
-    if (isLong && outStride == 1)
+    if (isLong)
         TurnHalfComplex(h, wave, scale, n, out);
     else
         for (std::ptrdiff_t k = 1; k < n / 2; ++k) {
@@ -53,20 +52,19 @@ ErrorCode ForwardEven(const FFTPlan *plan, const DBL *x, std::ptrdiff_t inStride
             const double im = h[n - k];
             const Pair turned = Pair(h[k]) * w + Pair(Pair::Vector{im, -im}) * w.reversed();
             const Pair result = turned * Pair(scale);
-            out[k * outStride] = result[0];
-            out[(n - k) * outStride] = result[1];
+            out[k] = result[0];
+            out[n - k] = result[1];
         }
-    out[n / 2 * outStride] = h[n / 2] * wave[n] * scale;
+    out[n / 2] = h[n / 2] * wave[n] * scale;
     return 0;
 }
 
-ErrorCode ForwardOdd(const FFTPlan *plan, const DBL *x, std::ptrdiff_t inStride, DBL *out,
-                     std::ptrdiff_t outStride, int32_t n, DBL *work) {
+ErrorCode ForwardOdd(const FFTPlan *plan, const DBL *x, DBL *out, int32_t n, DBL *work) {
     const std::ptrdiff_t length = 2 * std::ptrdiff_t{n};
     DBL *const mirrored = work;
     DBL *const h = work + length;
     for (std::ptrdiff_t j = 0; j < n; ++j)
-        mirrored[j] = mirrored[length - 1 - j] = x[j * inStride];
+        mirrored[j] = mirrored[length - 1 - j] = x[j];
     if (const ErrorCode failed =
             FFTRealForward(plan, mirrored, h, 1, 1, static_cast<int32_t>(length)))
         return failed;
@@ -79,14 +77,13 @@ ErrorCode ForwardOdd(const FFTPlan *plan, const DBL *x, std::ptrdiff_t inStride,
     for (std::ptrdiff_t k = 1; k <= n / 2; ++k) {
         const double c = wave[4 * k];
         const double s = wave[4 * k + 1];
-        out[k * outStride] = (h[k] * c + h[length - k] * s) * scale;
-        out[(n - k) * outStride] = (h[n - k] * s + h[n + k] * c) * scale;
+        out[k] = (h[k] * c + h[length - k] * s) * scale;
+        out[n - k] = (h[n - k] * s + h[n + k] * c) * scale;
     }
     return 0;
 }
 
-ErrorCode InverseEven(const DBL *spectrum, std::ptrdiff_t inStride, DBL *out,
-                      std::ptrdiff_t outStride, int32_t n, DBL *work, const FFTPlan *plan) {
+ErrorCode InverseEven(const FFTPlan *plan, const DBL *spectrum, DBL *out, int32_t n, DBL *work) {
     const DBL *const wave = QuarterWave(plan);
     if (!wave)
         return ErrOutOfMemory;
@@ -95,31 +92,14 @@ ErrorCode InverseEven(const DBL *spectrum, std::ptrdiff_t inStride, DBL *out,
     CDB *const u = z + n;
     const double scale = std::sqrt(2.0 * n);
     z[0] = CDB{spectrum[0] * std::sqrt(static_cast<double>(n)), 0};
-    if (inStride == 1)
-        TurnReal(spectrum, wave, scale, n, work);
-    else
-        for (std::ptrdiff_t k = 1; k <= n / 2; ++k) {
-            const double c = wave[2 * k] * scale;
-            const double s = wave[2 * k + 1] * scale;
-            const double low = spectrum[k * inStride];
-            const double high = spectrum[(n - k) * inStride];
-            z[k] = CDB{low * c, low * s};
-            z[n - k] = CDB{high * s, high * c};
-        }
+    TurnReal(spectrum, wave, scale, n, work);
     if (const ErrorCode failed = FFTComplexInverse(plan, &z->re, &z->im, &u->re, &u->im, 2, 2, n))
         return failed;
-    if (outStride == 1)
-        SpreadEvenOdd(&u->re, n, out);
-    else
-        for (std::ptrdiff_t j = 0; j < n / 2; ++j) {
-            out[2 * j * outStride] = u[j].re;
-            out[(2 * j + 1) * outStride] = u[n - 1 - j].re;
-        }
+    SpreadEvenOdd(&u->re, n, out);
     return 0;
 }
 
-ErrorCode InverseOdd(const DBL *spectrum, std::ptrdiff_t inStride, DBL *out,
-                     std::ptrdiff_t outStride, int32_t n, DBL *work, const FFTPlan *plan) {
+ErrorCode InverseOdd(const FFTPlan *plan, const DBL *spectrum, DBL *out, int32_t n, DBL *work) {
     const DBL *const wave = QuarterWave(plan);
     if (!wave)
         return ErrOutOfMemory;
@@ -132,8 +112,8 @@ ErrorCode InverseOdd(const DBL *spectrum, std::ptrdiff_t inStride, DBL *out,
     for (std::ptrdiff_t k = 1; k <= n / 2; ++k) {
         const double c = wave[4 * k] * scale;
         const double s = wave[4 * k + 1] * scale;
-        const double low = spectrum[k * inStride];
-        const double high = spectrum[(n - k) * inStride];
+        const double low = spectrum[k];
+        const double high = spectrum[n - k];
         h[k] = low * c;
         h[length - k] = low * s;
         h[n - k] = high * s;
@@ -142,38 +122,29 @@ ErrorCode InverseOdd(const DBL *spectrum, std::ptrdiff_t inStride, DBL *out,
     if (const ErrorCode failed = FFTRealInverse(plan, h, u, 1, 1, static_cast<int32_t>(length)))
         return failed;
     for (std::ptrdiff_t j = 0; j < n; ++j)
-        out[j * outStride] = u[j];
+        out[j] = u[j];
     return 0;
 }
 
 } // namespace
 
-ErrorCode DCTForward(const FFTPlan *plan, const DBL *in, int32_t inCount, DBL *out,
-                     int32_t inStride, int32_t outStride, int32_t n, DBL *work) {
-    if (inCount < 1)
-        return ErrEmptyInput;
-    if (n < 1)
-        return ErrFFTSizeNotPositive;
-    if (plan->length != DCTPlanLength(n))
-        return ErrInternal;
-    StridedWindow x;
-    if (const ErrorCode failed = x.take(in, inCount, inStride, n))
+ErrorCode DCTForward(const FFTPlan *plan, ConstRealVector in, RealVector out, DBL *work) {
+    const auto n = static_cast<int32_t>(out.size());
+    QX_EXPECTS(n >= 1 && plan->length == DCTPlanLength(n));
+    PaddedInput x;
+    if (const ErrorCode failed = x.take(in, n))
         return failed;
     if (n == 8) // the block of image coding; so short that the code around the transform costs most
-        return ForwardEven(plan, x.data, x.stride, out, outStride,
-                           std::integral_constant<int32_t, 8>(), work);
+        return ForwardEven(plan, x.data, out.data(), std::integral_constant<int32_t, 8>(), work);
     const auto forward = n % 2 == 0 ? ForwardEven<int32_t> : ForwardOdd;
-    return forward(plan, x.data, x.stride, out, outStride, n, work);
+    return forward(plan, x.data, out.data(), n, work);
 }
 
-ErrorCode DCTInverse(const DBL *in, DBL *out, int32_t inStride, int32_t outStride, int32_t n,
-                     DBL *work, const FFTPlan *plan) {
-    if (n < 1)
-        return ErrEmptyInput;
-    if (plan->length != DCTPlanLength(n))
-        return ErrInternal;
+ErrorCode DCTInverse(const FFTPlan *plan, ConstRealVector in, RealVector out, DBL *work) {
+    const auto n = static_cast<int32_t>(out.size());
+    QX_EXPECTS(n >= 1 && in.size() >= n && plan->length == DCTPlanLength(n));
     const auto inverse = n % 2 == 0 ? InverseEven : InverseOdd;
-    return inverse(in, inStride, out, outStride, n, work, plan);
+    return inverse(plan, in.data(), out.data(), n, work);
 }
 
 } // namespace qx

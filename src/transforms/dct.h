@@ -2,6 +2,7 @@
 #define QX_TRANSFORMS_DCT_H
 
 #include "fft/plan.h"
+#include "frame/views.h"
 #include "qx/errors.h"
 #include "qx/types.h"
 
@@ -22,15 +23,11 @@ inline int64_t DCTPlanLength(int32_t n) { return n % 2 == 0 ? int64_t{n} : 2 * i
 inline int64_t DCTForwardWork(int32_t n) { return n % 2 == 0 ? 2 * int64_t{n} : 4 * int64_t{n}; }
 inline int64_t DCTInverseWork(int32_t n) { return 4 * int64_t{n}; }
 
-// Strides count values. The forward transform takes the first n values of the input, with zeros
-// behind its end where n exceeds inCount. Input and output may be the same memory.
-//
-// ErrEmptyInput, ErrFFTSizeNotPositive, ErrInternal for a plan of another length,
-// ErrOutOfMemory.
-ErrorCode DCTForward(const FFTPlan *plan, const DBL *in, int32_t inCount, DBL *out,
-                     int32_t inStride, int32_t outStride, int32_t n, DBL *work);
-ErrorCode DCTInverse(const DBL *in, DBL *out, int32_t inStride, int32_t outStride, int32_t n,
-                     DBL *work, const FFTPlan *plan);
+// The output has n values, and the plan is one for n. The forward transform takes the first n values
+// of the input, with zeros behind its end where it is shorter; the inverse takes n values. Input and
+// output may be the same memory. ErrOutOfMemory.
+ErrorCode DCTForward(const FFTPlan *plan, ConstRealVector in, RealVector out, DBL *work);
+ErrorCode DCTInverse(const FFTPlan *plan, ConstRealVector in, RealVector out, DBL *work);
 
 } // namespace qx
 

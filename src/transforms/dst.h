@@ -2,6 +2,7 @@
 #define QX_TRANSFORMS_DST_H
 
 #include "fft/plan.h"
+#include "frame/views.h"
 #include "qx/errors.h"
 #include "qx/types.h"
 
@@ -19,16 +20,11 @@ inline int64_t DSTPlanLength(int32_t n) { return 2 * int64_t{n} + 2; }
 // The size of the work buffer, in values.
 inline int64_t DSTWork(int32_t n) { return 4 * (int64_t{n} + 1); }
 
-// Strides count values. The forward transform takes the first n values of the input, with zeros
-// behind its end where n exceeds inCount; the inverse has no such window. Input and output may
-// be the same memory.
-//
-// ErrEmptyInput, ErrFFTSizeNotPositive, ErrInternal for a plan of another length,
-// ErrOutOfMemory.
-ErrorCode DSTForward(const FFTPlan *plan, const DBL *in, int32_t inCount, DBL *out,
-                     int32_t inStride, int32_t outStride, int32_t n, DBL *work);
-ErrorCode DSTInverse(const DBL *in, DBL *out, int32_t inStride, int32_t outStride, int32_t n,
-                     DBL *work, const FFTPlan *plan);
+// The output has n values, and the plan is one for n. The forward transform takes the first n values
+// of the input, with zeros behind its end where it is shorter; the inverse takes n values. Input and
+// output may be the same memory. ErrOutOfMemory.
+ErrorCode DSTForward(const FFTPlan *plan, ConstRealVector in, RealVector out, DBL *work);
+ErrorCode DSTInverse(const FFTPlan *plan, ConstRealVector in, RealVector out, DBL *work);
 
 } // namespace qx
 

@@ -93,11 +93,11 @@ ErrorCode SeparableForward(const FFTPlan *columnPlan, const FFTPlan *rowPlan,
     if (const ErrorCode failed = work.take(Transform::forwardWork(in.rows()),
                                            Transform::forwardWork(in.cols()), in.rows()))
         return failed;
-    return InBothDirections(columnPlan, rowPlan, in, out, false, work.columns,
-                            [&](const FFTPlan *plan, const DBL *from, DBL *to, int32_t n) {
-                                return Transform::forward(plan, from, n, to, 1, 1, n,
-                                                          work.block.data());
-                            });
+    return InBothDirections(
+        columnPlan, rowPlan, in, out, false, work.columns,
+        [&](const FFTPlan *plan, const DBL *from, DBL *to, int32_t n) {
+            return Transform::forward(plan, {from, n}, {to, n}, work.block.data());
+        });
 }
 
 template <class Transform>
@@ -110,7 +110,7 @@ ErrorCode SeparableInverse(const FFTPlan *columnPlan, const FFTPlan *rowPlan,
     return InBothDirections(
         columnPlan, rowPlan, in, out, Transform::inverseRunsColumnsFirst, work.columns,
         [&](const FFTPlan *plan, const DBL *from, DBL *to, int32_t n) {
-            return Transform::inverse(from, to, 1, 1, n, work.block.data(), plan);
+            return Transform::inverse(plan, {from, n}, {to, n}, work.block.data());
         });
 }
 

@@ -52,7 +52,7 @@ ErrorCode RightHalf(DBL *w, int32_t half, int32_t length, double ratio) {
         return FFTRealInverse(plan.get(), spectrum.data(), w, 1, 1, length);
     }
     spectrum[0] *= std::sqrt(0.5);
-    return DCTInverse(spectrum.data(), w, 1, 1, half, work.data(), plan.get());
+    return DCTInverse(plan.get(), spectrum.part(0, half), {w, half}, work.data());
 }
 
 // Fills w, of two values or more, with the window, not normalised: the inverse transform of

@@ -289,6 +289,15 @@ TEST(Filtering, ARecursionDecaysToZeroAndNotToDenormals) {
             EXPECT_TRUE(value == 0.0 || value > tiny);
         EXPECT_GT(y[1900], 0.0) << "not before its time";
     }
+    // The last section of a cascade, of however many, has outputs below its states.
+    for (std::size_t sections = 1; sections <= 17; ++sections) {
+        Signal b(3 * sections);
+        for (std::size_t s = 0; s < sections; ++s)
+            b[3 * s] = s + 1 < sections ? 1.0 : 1e-300;
+        const auto small =
+            Cascade<DBLArray>(IIR_Filter2, 0, Signal(2 * sections), b)(Signal(100, 1e-10));
+        EXPECT_EQ(small, Signal(100)) << sections << " sections";
+    }
     const auto infinite =
         TwoStates<DBLArray, DBLArray>(IIR_Filter, Signal{0}, Signal{1})(Signal{3});
     EXPECT_TRUE(std::isinf(infinite[0])) << "nobody tests a[0]";

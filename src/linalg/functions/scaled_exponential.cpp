@@ -57,9 +57,12 @@ public:
         if (const ErrorCode failed = memory_.take(
                 Sized(a_, n_, n_), Sized(a2_, n_, n_), Sized(a4_, n_, n_), Sized(a6_, n_, n_),
                 Sized(odd_, n_, n_), Sized(even_, n_, n_), Sized(x_, n_), Sized(y_, n_),
-                Sized(sums_, n_), Sized(next_, n_), Sized(pivots_, n_)))
+                Sized(sums_, n_), Sized(next_, n_), Sized(exponents_, n_), Sized(pivots_, n_)))
             return failed;
         CopyMatrix<E>(a, a_);
+        const bool isBalanced = oneNorm(a_) >= tooLargeForOnes;
+        if (isBalanced)
+            balance();
         if (!formPowers()) { // those of 2^-power_ a do not overflow
             power_ = ScaleTo<E>(a_, mostBinary);
             formPowers();
@@ -73,18 +76,77 @@ public:
             OrderedProduct<E>(out_, out_, odd_);
             CopyMatrix<E>(odd_, out_);
         }
+        if (isBalanced)
+            scaleSimilarly(out_, 1);
         return 0;
     }
 
 private:
     static constexpr int mostBinary = 10;
+    static constexpr double tooLargeForOnes = 0x1p53; // rounding errors of the norm's size exceed 1
+    static constexpr int mostExponent = 1024;         // every element is below 2^mostExponent
+
+    // a_ becomes D^-1 a_ D, where D is diagonal and has the powers of two 2^exponents_, so that the
+    // largest element is as small as that can make it, but not below 1: about the largest geometric
+    // mean of the moduli on a cycle, which is at most the spectral radius of the matrix of moduli.
+    void balance() {
+        for (int32_t i = 0; i < n_; ++i)
+            for (int32_t j = 0; j < n_; ++j)
+                even_(i, j) = ScalarOf<E>::Of(binaryExponent(a_(i, j)));
+        int tooSmall = -1, bound = mostExponent;
+        while (bound - tooSmall > 1) {
+            const int middle = tooSmall + (bound - tooSmall) / 2;
+            (findExponents(middle) ? bound : tooSmall) = middle;
+        }
+        findExponents(bound);
+        scaleSimilarly(a_, -1);
+    }
+    static double binaryExponent(const ElementOf<E> &element) {
+        const double size = std::max(std::fabs(RealPart(element)), std::fabs(ImagPart(element)));
+        int exponent;
+        std::frexp(size, &exponent);
+        return size > 0.0 ? exponent : -HUGE_VAL;
+    }
+    // Sets exponents with which every scaled element is below 2^bound; false where there are none.
+    // exponents_[j] - exponents_[i] may be `bound` less the exponent of element (i, j) at most: with
+    // that as length of the edge from i to j, shortest paths are exponents (Bellman and Ford), those
+    // from anywhere to j (sums_) and negated ones from i to anywhere (next_). The mean of the two has
+    // the smaller values.
+    bool findExponents(int bound) {
+        for (int32_t i = 0; i < n_; ++i)
+            sums_[i] = next_[i] = 0.0;
+        bool changes = true;
+        for (int32_t round = 0; changes && round <= n_; ++round) {
+            changes = false;
+            for (int32_t i = 0; i < n_; ++i)
+                for (int32_t j = 0; j < n_; ++j) {
+                    const double length = bound - RealPart(even_(i, j));
+                    changes |= sums_[j] > sums_[i] + length || next_[i] < next_[j] - length;
+                    sums_[j] = std::min<double>(sums_[j], sums_[i] + length);
+                    next_[i] = std::max<double>(next_[i], next_[j] - length);
+                }
+        }
+        if (changes) // a cycle of negative length
+            return false;
+        for (int32_t i = 0; i < n_; ++i)
+            exponents_[i] = static_cast<int32_t>(std::floor((sums_[i] + next_[i]) / 2.0));
+        return true;
+    }
+    // Multiplies the elements of a by 2^(times (exponents_[row] - exponents_[column])).
+    void scaleSimilarly(const Matrix &a, int times) const {
+        for (int32_t i = 0; i < n_; ++i)
+            for (int32_t j = 0; j < n_; ++j)
+                a(i, j) = TimesPower(a(i, j), times * (exponents_[i] - exponents_[j]));
+    }
 
     bool formPowers() {
         OrderedProduct<E>(a_, a_, a2_);
         OrderedProduct<E>(a2_, a2_, a4_);
         OrderedProduct<E>(a2_, a4_, a6_);
-        constexpr double tooLarge = 0x1p600; // for the products of them that are estimated
-        return oneNorm(a4_) < tooLarge && oneNorm(a6_) < tooLarge && oneNorm(a_) < HUGE_VAL;
+        // For the products of them that are estimated, and for the coefficients of the approximants.
+        constexpr double tooLarge = 0x1p600, tooLargeOnce = 0x1p960;
+        return oneNorm(a4_) < tooLarge && oneNorm(a6_) < tooLarge && oneNorm(a_) < tooLargeOnce &&
+               oneNorm(a2_) < tooLargeOnce;
     }
 
     // Sets the degree and scales the powers; how often the approximant is to be squared.
@@ -259,7 +321,7 @@ private:
     Matrix a_, a2_, a4_, a6_, odd_, even_, out_;
     VectorView<E> x_, y_;
     RealVector sums_, next_;
-    IndexVector pivots_;
+    IndexVector exponents_, pivots_;
 };
 
 } // namespace

@@ -253,7 +253,7 @@ TEST(MatrixExponential, TakesADiagonalElementByElement) {
 // 2^1024, by which such matrices are divided, is no number.
 // exp of (x, y; 0, z) has y (exp(x) - exp(z)) / (x - z) beside its diagonal, whatever the size of y.
 TEST(MatrixExponential, OfTheRevisionLosesNothingToOneLargeElement) {
-    for (const double large : {1.0, 1e6, 1e100, 1e290}) {
+    for (const double large : {1.0, 1e6, 1e100, 1e290, 1e308}) {
         SCOPED_TRACE(large);
         DBL2DArray out;
         EXPECT_EQ(MatrixExp2026_head(DBL2DArray(2, 2, {1, large, 0, -1}).handle(), out.handle()),
@@ -278,6 +278,68 @@ TEST(MatrixExponential, OfTheRevisionLosesNothingToOneLargeElement) {
     EXPECT_EQ(MatrixExp2026_head(DBL2DArray(2, 2, {-1e300, 1, 1, -1e300}).handle(), out.handle()),
               0);
     EXPECT_EQ(out.values(), std::vector<double>(4, 0.0));
+}
+
+// As far as the result has numbers: by a similarity with a diagonal matrix these are matrices next to 1.
+TEST(MatrixExponential, OfTheRevisionTakesElementsOfAnySize) {
+    const auto expectExponential = [](const std::vector<double> &a,
+                                      const std::vector<double> &expected) {
+        const int n = expected.size() == 4 ? 2 : 3;
+        const auto expectNear = [](double value, double wanted) {
+            if (std::isinf(wanted) || wanted == 0.0)
+                EXPECT_EQ(value, wanted);
+            else
+                EXPECT_NEAR(value / wanted, 1.0, 2e-15);
+        };
+        DBL2DArray out;
+        EXPECT_EQ(MatrixExp2026_head(DBL2DArray(n, n, a).handle(), out.handle()), 0);
+        // With D = diag(1, i, 1), D^-1 a D is complex, and so is the exponential.
+        std::vector<CDB> turned;
+        const auto turns = [n](std::size_t k) {
+            return (k / n == 1) != (k % n == 1) ? (k / n == 1 ? -1 : 1) : 0;
+        };
+        for (std::size_t k = 0; k < a.size(); ++k)
+            turned.push_back(turns(k) ? CDB{0, turns(k) * a[k]} : CDB{a[k], 0});
+        CDB2DArray complexOut;
+        EXPECT_EQ(CxMatrixExp2026_head(CDB2DArray(n, n, turned).handle(), complexOut.handle()), 0);
+        for (std::size_t k = 0; k < a.size(); ++k) {
+            SCOPED_TRACE(testing::Message() << "element " << k << " of the exponential of "
+                                            << testing::PrintToString(a));
+            expectNear(out[k], expected[k]);
+            const CDB z = complexOut[k];
+            if (std::isfinite(expected[k]))
+                expectNear(turns(k) ? turns(k) * z.im : z.re, expected[k]);
+        }
+    };
+    const double e = std::exp(1.0);
+    for (const double x : {1e150, 1e200, 1e300, 1.7e308}) {
+        expectExponential({0, x, 0, 0}, {1, x, 0, 1});
+        expectExponential({0, 0, -x, 0}, {1, 0, -x, 1});
+        expectExponential({0, x, x, 0, 0, x, 0, 0, 0}, {1, x, x * x / 2 + x, 0, 1, x, 0, 0, 1});
+        expectExponential({-1, 0, 0, 0, 0, x, 0, 0, 0}, {1 / e, 0, 0, 0, 1, x, 0, 0, 1});
+        expectExponential({1, x, 0, 1}, {e, e * x, 0, e});
+        expectExponential({1, x, 0, -1}, {e, std::sinh(1.0) * x, 0, 1 / e});
+        expectExponential({0, x, -1 / x, 0},
+                          {std::cos(1.0), std::sin(1.0) * x, -std::sin(1.0) / x, std::cos(1.0)});
+        expectExponential({x, x, x, x}, std::vector<double>(4, HUGE_VAL));
+        expectExponential({-x, x, 0, -x}, std::vector<double>(4, 0.0));
+    }
+}
+
+// The sixth power is 0, but on the way to the eighth, products overflow that would cancel: the estimate
+// of its norm is infinite, and no count of squarings. The sanitizers see it converted.
+TEST(MatrixExponential, OfTheRevisionEndsWherePowersCancel) {
+    std::vector<double> a(64);
+    for (int i = 0; i < 8; ++i) {
+        a[8 * i] = -0x1p140;
+        if (i < 3)
+            a[8 * i + i + 1] = 0x1p140;
+        for (int j = 4; i >= 3 && j < 8; ++j)
+            a[8 * i + j] = std::vector<double>{0x1p141, -0x1p141, 0x1p141, -0x1p140}[j - 4];
+    }
+    DBL2DArray out;
+    EXPECT_EQ(MatrixExp2026_head(DBL2DArray(8, 8, a).handle(), out.handle()), 0);
+    EXPECT_EQ(out.rows(), 8);
 }
 
 TEST(MatrixExponential, OfTheLargestNormsIsInfiniteOrZero) {

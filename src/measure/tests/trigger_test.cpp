@@ -181,6 +181,7 @@ TEST(Trigger, FailuresComeInOrderAndLeaveTheState) {
     EXPECT_EQ(fails(y, nan, 0, 0, 5, 0), ErrNonFiniteInput);
     EXPECT_EQ(fails(y, 0, inf, 0, 5, 0), ErrNonFiniteInput);
     EXPECT_EQ(fails(y, 1, 0, 0, 0, 0), ErrNonFiniteInput);
+    EXPECT_EQ(fails(DBLArray{-inf, -inf, 2}, 1, 0, 0, 0, 0), ErrNonFiniteInput);
 
     // Samples behind the one that triggers are not looked at.
     int32_t index;

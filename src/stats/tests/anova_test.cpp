@@ -179,6 +179,7 @@ TEST(Anova, CodesComeInTheirOrder) {
     EXPECT_EQ(AnovaOf({}, {}, 2, 0.5).err, ErrEmptyInput);
     EXPECT_EQ(code({1, 2, 1, 2}, 1, 2.0), ErrAnovaFewLevels);
     EXPECT_EQ(code({1, 2, 1, 2}, 4, 2.0), ErrAnovaFewLevels);
+    EXPECT_EQ(AnovaOf(y, {0, 1, 2, 3}, 4, 0.5, Anova1Way_head_2026).err, ErrAnovaFewLevels);
     EXPECT_EQ(code({1, 2, 1, 2}, 2, 2.0), ErrBadSignificance);
     EXPECT_EQ(code({1, 2, 3, 2}, 2, 0.5), ErrAnovaFactorEmpty);
     EXPECT_EQ(code({1, 1, 1, 1}, 2, 0.5), ErrAnovaNoReplication);

@@ -42,7 +42,7 @@ Outcome Forward(In<DBL1D> in, Out<DBL1D> out, int32_t size, Keep keep) {
     if (Transform::planBeforeWork)
         if (const ErrorCode failed = work.allocate(Transform::forwardWork(n)))
             return failed;
-    return Transform::forward(keep.plan(), in.data(), in.size(), out.data(), 1, 1, n, work.data());
+    return Transform::forward(keep.plan(), in.view(), out.view(), work.data());
 }
 
 template <class Transform, class Keep>
@@ -61,7 +61,7 @@ Outcome Inverse(In<DBL1D> in, Out<DBL1D> out, Keep keep) {
     if (Transform::planBeforeWork)
         if (work.allocate(Transform::inverseWork(n)) != 0)
             return Transform::inverseWithoutWork;
-    return Transform::inverse(in.data(), out.data(), 1, 1, n, work.data(), keep.plan());
+    return Transform::inverse(keep.plan(), in.view(), out.view(), work.data());
 }
 
 // Both plans and the output, in the order of the transform.

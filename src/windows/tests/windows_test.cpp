@@ -290,6 +290,9 @@ TEST(Windows, OneSampleAndNoneAndTheirCodes) {
     expect(1, TriangleWinH, 0, {0.0});
     expect(1, WelchWinH, 0, {1.0});
     expect(2, WelchWinH, 0, {0.0, 1.0});
+    expect(1, BohmanWinH, 0, {1.0});
+    expect(1, BartHannWinH, 0, {1.0});
+    expect(1, ParzenWinH, 0, {1.0});
     expect(2, BohmanWinH, 0, {0.0, 1.0});
     expect(2, BartHannWinH, 0, {0.0, 1.0});
     expect(1, [](DBL1D x) { return AllCosWinH(x, 1, 0); }, 0, {1.0});
