@@ -3,38 +3,15 @@
 #include "fit/residuals.h"
 #include "fit/weights.h"
 
-#include <algorithm>
-#include <cmath>
-
 namespace qx {
 
 namespace {
 
-// Products stand in arrays of their own, which the compiler vectorises.
 LineSums WeightedSums(const FitSamples &samples) {
-    constexpr int32_t chunk = 64;
     const auto &[x, y, w] = samples;
-    const int32_t n = samples.n();
-    const double largest = LargestWeight(w.data(), n);
-    LineSums sums = {};
-    double v[chunk], vx[chunk], vy[chunk], vxy[chunk], vxx[chunk];
-    for (int32_t from = 0; from < n; from += chunk) {
-        const int32_t count = std::min(chunk, n - from);
-        for (int32_t i = 0; i < count; ++i) {
-            v[i] = std::fabs(w[from + i]) / largest;
-            vx[i] = v[i] * x[from + i];
-            vy[i] = v[i] * y[from + i];
-            vxy[i] = vx[i] * y[from + i];
-            vxx[i] = vx[i] * x[from + i];
-        }
-        for (int32_t i = 0; i < count; ++i) {
-            sums.weight += v[i];
-            sums.x += vx[i];
-            sums.y += vy[i];
-            sums.xy += vxy[i];
-            sums.xx += vxx[i];
-        }
-    }
+    LineSums sums;
+    WeightedLineSums(x.data(), y.data(), w.data(), samples.n(),
+                     LargestWeight(w.data(), samples.n()), &sums);
     return sums;
 }
 

@@ -2,6 +2,7 @@
 #define QX_FIT_LINE_H
 
 #include "fit/samples.h"
+#include "frame/widths.h"
 #include "qx/errors.h"
 
 namespace qx {
@@ -17,6 +18,9 @@ struct LineSums {
     double weight, x, y, xy, xx;
 };
 LineSums SumsOfLine(const FitSamples &samples);
+// The same of weights whose largest magnitude is known.
+QX_BY_WIDTH(void, WeightedLineSums,
+            (const DBL *x, const DBL *y, const DBL *w, int32_t n, double largest, LineSums *sums))
 
 // The line of least squares, from the closed formula: equal abscissae give NaN or infinities.
 Line LineThrough(const FitSamples &samples);

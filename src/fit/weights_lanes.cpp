@@ -24,18 +24,23 @@ QX_INLINE L OneWhereUnequal(L a, L b) {
 // The counts are doubles, which are exact and need no conversion.
 void CountWeights(const DBL *w, int32_t n, WeightCounts *counts) {
     typedef Lanes<nativeLanes> L;
-    L used(0.0), broken(0.0);
+    constexpr int apart = 4; // sums, so that one need not wait for the other
+    L used[apart], broken[apart];
+    for (int k = 0; k < apart; ++k)
+        used[k] = broken[k] = L(0.0);
     int32_t i = 0;
-    for (; i + nativeLanes <= n; i += nativeLanes) {
-        const L weight = L::load(w + i);
-        used = used + OneWhereUnequal(weight, L(0.0));
-        broken = broken + OneWhereUnequal(weight, weight);
-    }
+    for (; i + apart * nativeLanes <= n; i += apart * nativeLanes)
+        for (int k = 0; k < apart; ++k) {
+            const L weight = L::load(w + i + k * nativeLanes);
+            used[k] = used[k] + OneWhereUnequal(weight, L(0.0));
+            broken[k] = broken[k] + OneWhereUnequal(weight, weight);
+        }
     *counts = {0.0, 0.0};
-    for (int lane = 0; lane < nativeLanes; ++lane) {
-        counts->used += used[lane];
-        counts->broken += broken[lane];
-    }
+    for (int k = 0; k < apart; ++k)
+        for (int lane = 0; lane < nativeLanes; ++lane) {
+            counts->used += used[k][lane];
+            counts->broken += broken[k][lane];
+        }
     for (; i < n; ++i) {
         counts->used += w[i] != 0.0 ? 1.0 : 0.0;
         counts->broken += w[i] != w[i] ? 1.0 : 0.0;
@@ -44,17 +49,18 @@ void CountWeights(const DBL *w, int32_t n, WeightCounts *counts) {
 
 double LargestWeight(const DBL *w, int32_t n) {
     typedef Lanes<nativeLanes> L;
-    constexpr int32_t step = 2 * nativeLanes;
-    L first(0.0), second(0.0);
+    constexpr int apart = 4;
+    L held[apart];
+    for (L &largest : held)
+        largest = L(0.0);
     int32_t i = 0;
-    for (; i + step <= n; i += step) {
-        first = Larger(Modulus(L::load(w + i)), first);
-        second = Larger(Modulus(L::load(w + i + nativeLanes)), second);
-    }
-    const L both = Larger(first, second);
+    for (; i + apart * nativeLanes <= n; i += apart * nativeLanes)
+        for (int k = 0; k < apart; ++k)
+            held[k] = Larger(Modulus(L::load(w + i + k * nativeLanes)), held[k]);
+    const L all = Larger(Larger(held[0], held[1]), Larger(held[2], held[3]));
     double largest = 0.0;
     for (int lane = 0; lane < nativeLanes; ++lane)
-        largest = both[lane] > largest ? both[lane] : largest;
+        largest = all[lane] > largest ? all[lane] : largest;
     for (; i < n; ++i) {
         const double size = w[i] < 0.0 ? -w[i] : w[i];
         largest = size > largest ? size : largest;

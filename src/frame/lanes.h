@@ -379,6 +379,16 @@ QX_INLINE void StorePairs(Lanes<8> pairs, DBL *const *to, std::ptrdiff_t at) {
 // exchange places. By turns each half of the vectors, as often as N halves.
 template <int N>
 QX_INLINE void Transpose(Lanes<N> *block) {
+    if constexpr (N == 4) { // within pairs, then pair by pair: a third of the instructions
+        const auto low = PairsLow(block[0], block[1]).v, lowBehind = PairsLow(block[2], block[3]).v;
+        const auto high = PairsHigh(block[0], block[1]).v;
+        const auto highBehind = PairsHigh(block[2], block[3]).v;
+        block[0] = Lanes<N>(__builtin_shufflevector(low, lowBehind, 0, 1, 4, 5));
+        block[1] = Lanes<N>(__builtin_shufflevector(high, highBehind, 0, 1, 4, 5));
+        block[2] = Lanes<N>(__builtin_shufflevector(low, lowBehind, 2, 3, 6, 7));
+        block[3] = Lanes<N>(__builtin_shufflevector(high, highBehind, 2, 3, 6, 7));
+        return;
+    }
     for (int half = N; half > 1; half /= 2) {
         Lanes<N> turned[N];
         for (int i = 0; i < N / 2; ++i) {

@@ -183,9 +183,11 @@ public:
     ErrorCode release();
 
 private:
-    // Parts that fit into a mebibyte share a block; larger ones have a block each, so that they
-    // need no more memory in one piece than the largest of them.
-    static constexpr int64_t sharedUpTo = int64_t{1} << 20;
+    // Parts that fit into eight mebibytes share a block: of several large blocks a heap may give the
+    // last one's pages back at each release, and to be given them anew costs more than most routines
+    // do with them. Larger parts have a block each, so that they need no more memory in one piece
+    // than the largest of them.
+    static constexpr int64_t sharedUpTo = int64_t{1} << 23;
     static int64_t wholeWords(int64_t bytes) { return (bytes + 7) / 8 * 8; }
     template <class... Places>
     ErrorCode takeApart(const ScratchPart<Places> &...parts) {

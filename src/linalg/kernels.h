@@ -28,6 +28,11 @@ QX_BY_WIDTH_TO_8(void, AddOuterProductComplex,
                  (CDB * a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const CDB *x,
                   const CDB *y))
 
+// a[i][j] -= x[i] y[j], x being a column of a's matrix, whose elements stand `stride` apart, too.
+QX_BY_WIDTH_TO_8(void, SubtractOuterProductComplex,
+                 (CDB * a, std::ptrdiff_t stride, int32_t rows, int32_t cols, const CDB *x,
+                  const CDB *y))
+
 // y[i] = sum over j of a[i][j] x[j]. Real sums run in eight partial sums, element j in sum j mod
 // 8, which are then added pairwise, and the last (cols mod 8) terms follow; complex ones in two.
 QX_BY_WIDTH_TO_8(void, RowProductsReal,

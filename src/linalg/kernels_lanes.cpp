@@ -84,6 +84,27 @@ void AddOuterProductComplex(CDB *a, std::ptrdiff_t stride, int32_t rows, int32_t
         AddComplexRows<1>(y, 0, cols, x + i, a + i * stride);
 }
 
+template <class L>
+static QX_INLINE void SubtractComplexMultiple(const CDB &factor, const DBL *y, DBL *a) {
+    const L row = L::load(y);
+    (L::load(a) - MinusPlus(L(factor.re) * row, L(factor.im) * Swapped(row))).store(a);
+}
+
+void SubtractOuterProductComplex(CDB *a, std::ptrdiff_t stride, int32_t rows, int32_t cols,
+                                 const CDB *x, const CDB *y) {
+    const DBL *const from = reinterpret_cast<const DBL *>(y);
+    const std::ptrdiff_t end = 2 * std::ptrdiff_t{cols};
+    for (int32_t i = 0; i < rows; ++i) {
+        const CDB factor = x[i * stride];
+        DBL *const to = reinterpret_cast<DBL *>(a + i * stride);
+        std::ptrdiff_t j = 0;
+        for (; j + nativeLanes <= end; j += nativeLanes)
+            SubtractComplexMultiple<Lanes<nativeLanes>>(factor, from + j, to + j);
+        for (; j < end; j += 2)
+            SubtractComplexMultiple<Lanes<2>>(factor, from + j, to + j);
+    }
+}
+
 // The products of some rows with x at once.
 template <int Rows>
 static void DotRows(const DBL *a, std::ptrdiff_t stride, int32_t n, const DBL *x, DBL *y) {

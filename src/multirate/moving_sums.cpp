@@ -55,6 +55,11 @@ template <ElementType Code, MovingSum Kind>
 void Passes(const MovingSumState<Code> &state, double scale, typename Element<Code>::type *x,
             int32_t n) {
     int32_t k = 0;
+    if constexpr (Code == ElementType::DBL)
+        // What it costs to lay the rings side by side and back is worth it for blocks longer than they.
+        if (state.width <= wavefrontWidth && n >= wavefrontSamples && n / 2 >= state.width)
+            for (; k + wavefrontStages <= state.stages; k += wavefrontStages)
+                MovingSumWavefront(state, k, Kind, scale, x, n);
     for (; k + 4 <= state.stages; k += 4)
         Pass<Code, Kind, 4>(state, k, scale, x, n);
     switch (state.stages - k) {

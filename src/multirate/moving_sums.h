@@ -2,6 +2,7 @@
 #define QX_MULTIRATE_MOVING_SUMS_H
 
 #include "frame/elements.h"
+#include "frame/widths.h"
 
 #include <cstdint>
 
@@ -32,6 +33,15 @@ struct MovingSumState {
 template <ElementType Code>
 void MovingSumStages(MovingSumState<Code> &state, MovingSum kind, double scale,
                      typename Element<Code>::type *x, int32_t n);
+
+// Eight stages from `first` on as one wavefront, in lanes: the same for rings of at most
+// wavefrontWidth and blocks of at least wavefrontSamples.
+constexpr int wavefrontStages = 8;
+constexpr int32_t wavefrontWidth = 256;
+constexpr int32_t wavefrontSamples = 64;
+QX_BY_WIDTH(void, MovingSumWavefront,
+            (const MovingSumState<ElementType::DBL> &state, int32_t first, MovingSum kind,
+             double scale, DBL *x, int32_t n))
 
 // Turns the rings so that the oldest input stands first.
 void StraightenRings(MovingSumState<ElementType::DBL> &state);

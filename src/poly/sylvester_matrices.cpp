@@ -28,7 +28,8 @@ CDB ProductAt(std::ptrdiff_t i, const CDB *a, std::ptrdiff_t degreeA, const CDB 
 ErrorCode SylvesterMatrices::allocate(int64_t rows, int64_t columns) {
     rowCapacity_ = static_cast<std::ptrdiff_t>(rows);
     return memory_.take(Sized(matrix_, rows * columns), Sized(vectors_, 2 * columns),
-                        Sized(kappas_, columns), Sized(diagonal_, columns));
+                        Sized(kappas_, columns), Sized(diagonal_, columns),
+                        Sized(pairs_, 2 * rows));
 }
 
 void SylvesterMatrices::begin(const CDB *p, int32_t m, const CDB *q, int32_t n) {
@@ -42,18 +43,27 @@ void SylvesterMatrices::begin(const CDB *p, int32_t m, const CDB *q, int32_t n) 
 void SylvesterMatrices::advance() {
     const int32_t gap = m_ - n_, rows = m_ + step_ + 1;
     if (step_ == 0)
-        for (int32_t shift = 0; shift < gap; ++shift)
-            appendColumn(q_, n_, shift, rows);
-    appendColumn(q_, n_, gap + step_, rows);
-    appendColumn(p_, m_, step_, rows);
+        for (int32_t shift = 0; shift < gap; ++shift) {
+            fillColumn(column(columns_), q_, n_, shift);
+            finishColumn(0, rows);
+        }
+    const std::ptrdiff_t before = columns_;
+    fillColumn(column(before), q_, n_, gap + step_);
+    fillColumn(column(before + 1), p_, m_, step_);
+    reflectPair(rows);
+    finishColumn(before, rows);
+    finishColumn(before, rows);
     ++step_;
 }
 
-void SylvesterMatrices::appendColumn(const CDB *a, int32_t degree, int32_t shift, int32_t rows) {
-    CDB *const added = column(columns_);
+void SylvesterMatrices::fillColumn(CDB *added, const CDB *a, int32_t degree, int32_t shift) const {
     for (std::ptrdiff_t i = 0; i < rowCapacity_; ++i)
         added[i] = i >= shift && i <= shift + degree ? a[i - shift] : CDB{};
-    for (std::ptrdiff_t j = 0; j < columns_; ++j) {
+}
+
+void SylvesterMatrices::finishColumn(std::ptrdiff_t j, int32_t rows) {
+    CDB *const added = column(columns_);
+    for (; j < columns_; ++j) {
         const CDB *const reflector = column(j);
         if (IsZero(kappas_[j]))
             continue;
@@ -70,6 +80,42 @@ void SylvesterMatrices::appendColumn(const CDB *a, int32_t degree, int32_t shift
     kappas_[columns_] = reflector.kappa;
     diagonal_[columns_] = reflector.beta;
     ++columns_;
+}
+
+// The columns stand side by side, and the products of the next reflector are summed in the pass that
+// reflects: most of the time goes into waiting for sums, and so four of them grow at once.
+void SylvesterMatrices::reflectPair(int32_t rows) {
+    CDB *const first = column(columns_), *const second = column(columns_ + 1);
+    for (std::ptrdiff_t i = 0; i < rows; ++i) {
+        pairs_[2 * i] = first[i];
+        pairs_[2 * i + 1] = second[i];
+    }
+    const auto nextFrom = [this](std::ptrdiff_t j) {
+        while (j < columns_ && IsZero(kappas_[j]))
+            ++j;
+        return j;
+    };
+    std::ptrdiff_t j = nextFrom(0);
+    CDB sums[2] = {};
+    if (j < columns_)
+        AddAdjointProducts(column(j) + j, rows - j, &pairs_[2 * j], sums);
+    while (j < columns_) {
+        const CDB factors[2] = {Quotient(sums[0], kappas_[j]), Quotient(sums[1], kappas_[j])};
+        const std::ptrdiff_t next = nextFrom(j + 1);
+        const std::ptrdiff_t alone = next < columns_ ? next : rows;
+        for (std::ptrdiff_t i = j; i < alone; ++i)
+            for (std::ptrdiff_t k = 0; k < 2; ++k)
+                pairs_[2 * i + k] -= column(j)[i] * factors[k];
+        sums[0] = sums[1] = CDB{};
+        if (next < columns_)
+            ReflectPairs(column(j) + next, factors, column(next) + next, rows - next,
+                         &pairs_[2 * next], sums);
+        j = next;
+    }
+    for (std::ptrdiff_t i = 0; i < rows; ++i) {
+        first[i] = pairs_[2 * i];
+        second[i] = pairs_[2 * i + 1];
+    }
 }
 
 // Inverse iteration with R^H R.
@@ -99,19 +145,38 @@ double SylvesterMatrices::pivot(std::ptrdiff_t i) const {
 }
 
 void SylvesterMatrices::solveAdjoint(const CDB *x, CDB *y) const {
-    for (std::ptrdiff_t i = 0; i < columns_; ++i) {
-        CDB sum = x[i];
-        for (std::ptrdiff_t j = 0; j < i; ++j)
-            sum -= Conj(column(i)[j]) * y[j];
-        y[i] = sum / pivot(i);
+    constexpr std::ptrdiff_t together = 4;
+    for (std::ptrdiff_t first = 0; first < columns_; first += together) {
+        const std::ptrdiff_t end = std::min<std::ptrdiff_t>(columns_, first + together);
+        std::ptrdiff_t done = 0; // terms of each sum
+        for (std::ptrdiff_t i = first; i < end; ++i)
+            y[i] = x[i];
+        if (end - first == together) {
+            SubtractAdjointProducts(column(first), rowCapacity_, y, first, y + first);
+            done = first;
+        }
+        for (std::ptrdiff_t i = first; i < end; ++i) {
+            CDB sum = y[i];
+            for (std::ptrdiff_t j = done; j < i; ++j)
+                sum -= Conj(column(i)[j]) * y[j];
+            y[i] = sum / pivot(i);
+        }
     }
 }
 
 void SylvesterMatrices::solveTriangle(CDB *x) const {
-    for (std::ptrdiff_t i = columns_ - 1; i >= 0; --i) {
-        x[i] = x[i] / pivot(i);
-        for (std::ptrdiff_t j = 0; j < i; ++j)
-            x[j] -= column(i)[j] * x[i];
+    constexpr std::ptrdiff_t together = 4;
+    for (std::ptrdiff_t last = columns_ - 1; last >= 0; last -= together) {
+        const bool areFour = last + 1 >= together;
+        const std::ptrdiff_t first = areFour ? last + 1 - together : 0;
+        CDB factors[together];
+        for (std::ptrdiff_t i = last; i >= first; --i) {
+            const CDB factor = factors[last - i] = x[i] = x[i] / pivot(i);
+            for (std::ptrdiff_t j = first; j < i; ++j)
+                x[j] -= column(i)[j] * factor;
+        }
+        if (areFour)
+            SubtractFourColumns(column(last), rowCapacity_, factors, first, x);
     }
 }
 

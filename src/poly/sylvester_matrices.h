@@ -2,6 +2,7 @@
 #define QX_POLY_SYLVESTER_MATRICES_H
 
 #include "frame/scratch.h"
+#include "frame/widths.h"
 #include "qx/errors.h"
 #include "qx/types.h"
 
@@ -38,7 +39,11 @@ public:
 
 private:
     CDB *column(std::ptrdiff_t j) const { return &matrix_[j * rowCapacity_]; }
-    void appendColumn(const CDB *a, int32_t degree, int32_t shift, int32_t rows);
+    void fillColumn(CDB *added, const CDB *a, int32_t degree, int32_t shift) const;
+    // Reflects the next column by the reflectors from j on, and has it make one of its own.
+    void finishColumn(std::ptrdiff_t j, int32_t rows);
+    // By all reflectors so far the next two columns.
+    void reflectPair(int32_t rows);
     double pivot(std::ptrdiff_t i) const;
     void solveAdjoint(const CDB *x, CDB *y) const;
     void solveTriangle(CDB *x) const;
@@ -46,10 +51,28 @@ private:
     std::ptrdiff_t rowCapacity_ = 0;
     const CDB *p_ = nullptr, *q_ = nullptr;
     int32_t m_ = 0, n_ = 0, step_ = 0, columns_ = 0;
-    ComplexVector matrix_, vectors_, kappas_;
+    ComplexVector matrix_, vectors_, kappas_, pairs_;
     RealVector diagonal_;
     ScratchParts memory_;
 };
+
+// The inner loops, with the order of arithmetic of their plain text.
+
+// x[j] -= c[j] factors[r] for four columns c, one after the other; column r is at columns - r stride.
+QX_BY_WIDTH(void, SubtractFourColumns,
+            (const CDB *columns, std::ptrdiff_t stride, const CDB *factors, std::ptrdiff_t n,
+             CDB *x))
+// sums[r] -= conj(c[j]) y[j] for j = 0 to n - 1 and four columns c; column r is at columns + r stride.
+QX_BY_WIDTH(void, SubtractAdjointProducts,
+            (const CDB *columns, std::ptrdiff_t stride, const CDB *y, std::ptrdiff_t n, CDB *sums))
+// Of two vectors, whose elements i are pairs[2 i] and pairs[2 i + 1]: sums[k] += conj(reflector[i])
+// x[i].
+QX_BY_WIDTH(void, AddAdjointProducts,
+            (const CDB *reflector, std::ptrdiff_t n, const CDB *pairs, CDB *sums))
+// x[i] -= reflector[i] factors[k], and then sums[k] += conj(next[i]) x[i].
+QX_BY_WIDTH(void, ReflectPairs,
+            (const CDB *reflector, const CDB *factors, const CDB *next, std::ptrdiff_t n,
+             CDB *pairs, CDB *sums))
 
 } // namespace qx
 

@@ -1,3 +1,4 @@
+#include "frame/lane_masks.h"
 #include "frame/lanes.h"
 #include "signal/waves.h"
 
@@ -35,11 +36,33 @@ __attribute__((always_inline)) inline L Reduced(L x) {
 }
 
 template <class L>
-__attribute__((always_inline)) inline L PhasesFrom(int32_t i, const WavePhases &phases,
-                                                   const DBL *y) {
-    if (phases.inPlace)
-        return L::load(y + i);
-    return Reduced(Indices<L>(i) * L(360.0) * L(phases.f) + L(phases.start));
+__attribute__((always_inline)) inline L Unreduced(L indices, const WavePhases &phases) {
+    return indices * L(360.0) * L(phases.f) + L(phases.start);
+}
+
+// Where less than a turn in eight vectors passes, most vectors lie within a turn, and their phases
+// are less by whole turns than those before the remainder is taken, without an error.
+template <class Shape>
+__attribute__((always_inline)) inline int32_t ShapedSlowly(const WavePhases &phases, int32_t n,
+                                                           DBL *y, Shape shape) {
+    typedef Lanes<nativeLanes> L;
+    if (phases.inPlace || !(phases.f >= 0.0 && phases.f * (8 * nativeLanes) < 1.0) ||
+        !(phases.start >= 0.0))
+        return 0;
+    const L step(nativeLanes), turn(360.0);
+    L indices = Indices<L>(0);
+    double turns = 0.0; // in degrees, at most the phase of the first lane
+    int32_t i = 0;
+    for (; n - i >= nativeLanes; i += nativeLanes, indices = indices + step) {
+        const L x = Unreduced(indices, phases);
+        L phase = x - L(turns);
+        if (__builtin_expect(Any(phase >= turn), 0)) {
+            phase = Reduced(x);
+            turns = x[nativeLanes - 1] - phase[nativeLanes - 1];
+        }
+        shape(phase).store(y + i);
+    }
+    return i;
 }
 
 template <class Shape>
@@ -47,11 +70,15 @@ __attribute__((always_inline)) inline void Shaped(const WavePhases &phases, int3
                                                   Shape shape) {
     typedef Lanes<nativeLanes> L;
     typedef Lanes<1> One;
-    int32_t i = 0;
-    for (; n - i >= L::count; i += L::count)
-        shape(PhasesFrom<L>(i, phases, y)).store(y + i);
+    const auto phasesFrom = [&]<class V>(V indices, const DBL *at) {
+        return phases.inPlace ? V::load(at) : Reduced(Unreduced(indices, phases));
+    };
+    int32_t i = ShapedSlowly(phases, n, y, shape);
+    L indices = Indices<L>(i);
+    for (; n - i >= L::count; i += L::count, indices = indices + L(L::count))
+        shape(phasesFrom(indices, y + i)).store(y + i);
     for (; i < n; ++i)
-        shape(PhasesFrom<One>(i, phases, y)).store(y + i);
+        shape(phasesFrom(One(i), y + i)).store(y + i);
 }
 
 } // namespace
@@ -67,21 +94,17 @@ void SquareSamples(WavePhases phases, int32_t n, double amp, double threshold, D
 void TriangleSamples(WavePhases phases, int32_t n, double amp, DBL *y) {
     Shaped(phases, n, y, [=]<class L>(L p) {
         const L q = p / L(180.0);
-        const L height(amp * 2.0);
-        const L rising = height * q;
-        const L falling = height * (L(1.0) - q);
-        const L returning = height * (q - L(2.0));
-        const L early(q.v < L(0.5).v ? rising.v : falling.v);
-        return L(q.v < L(1.5).v ? early.v : returning.v);
+        const L falling = L(1.0) - q, returning = q - L(2.0);
+        const L early(q.v < L(0.5).v ? q.v : falling.v);
+        return L(amp * 2.0) * L(q.v < L(1.5).v ? early.v : returning.v);
     });
 }
 
 void SawtoothSamples(WavePhases phases, int32_t n, double amp, DBL *y) {
     Shaped(phases, n, y, [=]<class L>(L p) {
         const L q = p * L(0.005555555555555556);
-        const L first = q * L(amp);
-        const L second = (q - L(2.0)) * L(amp);
-        return L(p.v < L(180.0).v ? first.v : second.v);
+        const L second = q - L(2.0);
+        return L(p.v < L(180.0).v ? q.v : second.v) * L(amp);
     });
 }
 

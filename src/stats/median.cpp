@@ -1,3 +1,4 @@
+#include "frame/constants.h"
 #include "frame/scratch.h"
 #include "stats/order.h"
 #include "stats/sort.h"
@@ -87,7 +88,33 @@ bool FindByBracket(ConstRealVector x, RealVector work, Middle *middle) {
     return middle->upper != 0.0 || negativeZeros == 0;
 }
 
-// Monotone data need no selection; false for others, and for a zero as above.
+// Of elements that fall from place `fall` on and rise before: binary search for how many of the k
+// smallest are at the left end; the others are at the right end.
+Middle MiddleOfRiseAndFall(ConstRealVector x, std::ptrdiff_t fall) {
+    const std::ptrdiff_t n = x.size(), k = n / 2;
+    std::ptrdiff_t left = std::max<std::ptrdiff_t>(0, k - (n - fall));
+    for (std::ptrdiff_t end = std::min(k, fall); left < end;) {
+        const std::ptrdiff_t i = left + (end - left) / 2;
+        if (x[i] < x[n - (k - i)])
+            left = i + 1;
+        else
+            end = i;
+    }
+    const std::ptrdiff_t right = n - (k - left); // the first of those at the right end
+    Middle middle = {-kInfinity, kInfinity};
+    if (left > 0)
+        middle.lower = x[left - 1];
+    if (right < n && x[right] > middle.lower)
+        middle.lower = x[right];
+    if (left < fall)
+        middle.upper = x[left];
+    if (right > fall && x[right - 1] < middle.upper)
+        middle.upper = x[right - 1];
+    return middle;
+}
+
+// Monotone data, and those that rise and then fall, need no selection; false for others, and for a
+// zero as above.
 bool ReadOff(ConstRealVector x, Middle *middle) {
     const std::ptrdiff_t n = x.size(), k = n / 2;
     if (n < 2)
@@ -96,6 +123,8 @@ bool ReadOff(ConstRealVector x, Middle *middle) {
         *middle = {x[k - 1], x[k]};
     else if (IsDescending(x))
         *middle = {x[n - k], x[n - 1 - k]};
+    else if (const std::ptrdiff_t fall = StartOfFall(x))
+        *middle = MiddleOfRiseAndFall(x, fall);
     else
         return false;
     return middle->upper != 0.0;

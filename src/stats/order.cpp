@@ -78,6 +78,24 @@ ErrorCode ArrayMaxMin(ConstRealVector x, Extremes *found) {
     return 0;
 }
 
+namespace {
+// Zeros of different signs are equal, and their order is that of the sort.
+bool HasNegativeZero(ConstRealVector ascending) {
+    std::ptrdiff_t i = 0, end = ascending.size();
+    while (i < end) { // to the first element that is not below 0
+        const std::ptrdiff_t middle = i + (end - i) / 2;
+        if (ascending[middle] < 0.0)
+            i = middle + 1;
+        else
+            end = middle;
+    }
+    for (; i < ascending.size() && ascending[i] == 0.0; ++i)
+        if (std::signbit(ascending[i]))
+            return true;
+    return false;
+}
+} // namespace
+
 void SortNaNsFirst(ConstRealVector x, SortOrder order, RealVector out) {
     const std::ptrdiff_t n = x.size();
     QX_EXPECTS(out.size() == n);
@@ -86,6 +104,16 @@ void SortNaNsFirst(ConstRealVector x, SortOrder order, RealVector out) {
     const bool isAscending = IsAscending(x);
     const bool isDescending = !isAscending && IsDescending(x);
     DBL *const a = out.data();
+    constexpr std::ptrdiff_t worthALook = 24; // shorter ones are sorted as fast
+    const bool looks = n >= worthALook && a != x.data() && !isAscending && !isDescending;
+    if (const std::ptrdiff_t fall = looks ? StartOfFall(x) : 0) {
+        MergeRiseAndFall(x, fall, out);
+        if (!HasNegativeZero(out)) {
+            if (order == SortOrder::Descending)
+                Reverse(a, n);
+            return;
+        }
+    }
     if (a != x.data())
         std::memcpy(a, x.data(), static_cast<std::size_t>(n) * sizeof(DBL));
     std::ptrdiff_t first = 0; // of those that are no NaN

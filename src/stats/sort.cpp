@@ -167,4 +167,39 @@ bool IsDescending(ConstRealVector a) {
     return a.size() > 1 || a[0] == a[0];
 }
 
+std::ptrdiff_t StartOfFall(ConstRealVector a) {
+    constexpr std::ptrdiff_t shortest = 4; // a rise that random data hardly have
+    std::ptrdiff_t start = 1;
+    while (start < a.size() && a[start - 1] <= a[start])
+        ++start;
+    if (start < shortest)
+        return 0;
+    std::ptrdiff_t i = start;
+    while (i < a.size() && a[i - 1] >= a[i])
+        ++i;
+    return i == a.size() ? start : 0;
+}
+
+// From the ends inward and from the peak outward at once, since each choice waits for the one before.
+void MergeRiseAndFall(ConstRealVector a, std::ptrdiff_t fall, RealVector out) {
+    QX_EXPECTS(out.size() == a.size());
+    const std::ptrdiff_t n = a.size();
+    std::ptrdiff_t first = 0, last = n - 1; // of those that are not among the smallest yet
+    // The largest that are left on either side of the peak; -1 or n where there is none.
+    std::ptrdiff_t rising = fall - 1, falling = fall;
+    for (std::ptrdiff_t i = 0; i < n / 2; ++i) {
+        const double small = a[first], other = a[last];
+        const bool isFirst = small <= other;
+        out[i] = isFirst ? small : other;
+        first += isFirst;
+        last -= !isFirst;
+        const bool isRising = falling == n || (rising >= 0 && a[rising] > a[falling]);
+        out[n - 1 - i] = a[isRising ? rising : falling];
+        rising -= isRising;
+        falling += !isRising;
+    }
+    if (n % 2 != 0)
+        out[n / 2] = a[first] <= a[last] ? a[first] : a[last];
+}
+
 } // namespace qx

@@ -97,14 +97,14 @@ TEST(Scratch, BlocksGoBackToWhereTheyCameFrom) {
 }
 
 TEST(Scratch, PartsAreTakenTogetherOrNotAtAll) {
-    const EnabledRegion region(uint32_t{1} << 22);
+    const EnabledRegion region(uint32_t{1} << 24);
     qx::RealVector x;
     qx::ComplexMatrix z;
     I32 *indices = nullptr;
     uint8_t *flags = nullptr;
     qx::ScratchParts memory;
-    // In one block, and in one each: 32 rows are below a mebibyte, 400 are above.
-    for (const int32_t rows : {32, 400}) {
+    // In one block, and in one each: 32 rows are below eight mebibytes, 3000 are above.
+    for (const int32_t rows : {32, 3000}) {
         ASSERT_EQ(memory.take(qx::Sized(flags, 5), qx::Sized(x, 3), qx::Sized(z, rows, 200),
                               qx::Sized(indices, 7)),
                   0);

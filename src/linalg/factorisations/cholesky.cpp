@@ -1,9 +1,12 @@
 #include "linalg/factorisations/cholesky.h"
 
+#include "frame/scratch.h"
 #include "linalg/kernels.h"
+#include "linalg/products/ordered.h"
 
 #include <algorithm>
 #include <cmath>
+#include <cstring>
 
 namespace qx {
 namespace {
@@ -57,35 +60,111 @@ void InvertUpper(ElementOf<E> *packed, int32_t n) {
     }
 }
 
+// The factor's columns as the rows of an upper triangle. In its packed form the rows are factored
+// one by one; in a square matrix they are halved until they are few, so that nearly all terms are
+// subtracted in products of blocks. Those of one element are subtracted in ascending order either
+// way.
+constexpr int32_t fewRows = 16;
+constexpr int32_t worthBlocks = 40;
+constexpr int32_t strip = 96; // of rows in a product, whose part left of the diagonal is in vain
+
+template <ElementType E, class Row>
+class Factorisation {
+public:
+    Factorisation(Row row, int32_t n) : row_(row), n_(n) {}
+
+    ErrorCode runOneByOne() { return factorOneByOne(0, n_) ? status_ : ErrNotPositiveDefinite; }
+    ErrorCode runByHalves() { return factorByHalves(0, n_) ? status_ : ErrNotPositiveDefinite; }
+
+private:
+    // False where a pivot is not above 0.
+    bool factorOneByOne(int32_t first, int32_t end) {
+        for (int32_t k = first; k < end; ++k) {
+            ElementOf<E> *const row = row_(k) + k;
+            for (int32_t j = first; j < k; ++j) {
+                const ElementOf<E> *const before = row_(j) + k;
+                AddMultiple<E>(row, -Conj(*before), before, n_ - k);
+            }
+            if (!divide(k))
+                return false;
+        }
+        return true;
+    }
+    bool factorByHalves(int32_t first, int32_t end) {
+        if (end - first <= fewRows)
+            return factorOneByOne(first, end);
+        const int32_t middle = first + (end - first) / 2;
+        if (!factorByHalves(first, middle))
+            return false;
+        for (int32_t top = middle; top < end; top += strip)
+            subtractTerms(first, middle, top, std::min(end - top, strip));
+        return factorByHalves(middle, end);
+    }
+
+    // The terms of rows `first` to `middle` in `rows` rows from `top` on.
+    void subtractTerms(int32_t first, int32_t middle, int32_t top, int32_t rows) {
+        ElementOf<E> *const from = row_(first) + top, *const to = row_(top) + top;
+        if constexpr (E == ElementType::DBL)
+            AddProductReal(rows, n_ - top, middle - first, {-1.0}, {from, 1, n_}, {from, n_, 1}, to,
+                           n_);
+        else
+            AddProductComplex(rows, n_ - top, middle - first, {-1.0, 0.0}, {from, 1, n_, true},
+                              {from, n_, 1, false}, to, n_);
+    }
+
+    // Row k, whose terms have all been subtracted.
+    bool divide(int32_t k) {
+        ElementOf<E> *const row = row_(k);
+        const double pivot = RealPart(row[k]);
+        if (!(pivot > 0.0))
+            return false;
+        const double root = std::sqrt(pivot);
+        row[k] = ScalarOf<E>::Of(root);
+        const double least = std::min(least_, root);
+        double largest = std::max(largest_, root);
+        for (int32_t i = k + 1; i < n_; ++i) {
+            row[i] = row[i] / root;
+            largest = std::max(largest, Modulus(row[i]));
+        }
+        if (least < 0x1p-26 * largest)
+            status_ = ErrNotPositiveDefinite;
+        least_ = least;
+        largest_ = largest;
+        return true;
+    }
+
+    Row row_;
+    int32_t n_;
+    double largest_ = 0.0, least_ = HUGE_VAL;
+    ErrorCode status_ = 0;
+};
+template <ElementType E, class Row>
+Factorisation<E, Row> FactorisationOf(const Row &row, int32_t n) {
+    return {row, n};
+}
+
 } // namespace
 
 template <ElementType E>
 ErrorCode PackedCholesky(VectorView<E> triangle, int32_t n) {
     QX_EXPECTS(triangle.size() >= PackedLength(n));
     ElementOf<E> *const packed = triangle.data();
-    ErrorCode status = 0;
-    double largest = 0.0, least = HUGE_VAL;
-    for (int32_t k = 0; k < n; ++k) {
-        ElementOf<E> *const column = LowerColumn<E>(packed, n, k);
-        for (int32_t j = 0; j < k; ++j) {
-            const ElementOf<E> *const before = LowerColumn<E>(packed, n, j);
-            AddMultiple<E>(column + k, -Conj(before[k]), before + k, n - k);
-        }
-        const double pivot = RealPart(column[k]);
-        if (!(pivot > 0.0))
-            return ErrNotPositiveDefinite;
-        const double root = std::sqrt(pivot);
-        column[k] = ScalarOf<E>::Of(root);
-        least = std::min(least, root);
-        largest = std::max(largest, root);
-        for (int32_t i = k + 1; i < n; ++i) {
-            column[i] = column[i] / root;
-            largest = std::max(largest, Modulus(column[i]));
-        }
-        if (least < 0x1p-26 * largest)
-            status = ErrNotPositiveDefinite;
-    }
-    return status;
+    MatrixView<E> rows;
+    ScratchParts memory;
+    if (n < worthBlocks || memory.take(Sized(rows, n, n)) != 0)
+        return FactorisationOf<E>([=](int32_t j) { return LowerColumn<E>(packed, n, j); }, n)
+            .runOneByOne();
+    std::memset(rows.data(), 0, sizeof(ElementOf<E>) * static_cast<std::size_t>(rows.count()));
+    const auto copy = [n](int32_t j, ElementOf<E> *to, const ElementOf<E> *from) {
+        std::memcpy(to + j, from + j, sizeof(ElementOf<E>) * static_cast<std::size_t>(n - j));
+    };
+    for (int32_t j = 0; j < n; ++j)
+        copy(j, rows.row(j), LowerColumn<E>(packed, n, j));
+    const ErrorCode status =
+        FactorisationOf<E>([&](int32_t j) { return rows.row(j); }, n).runByHalves();
+    for (int32_t j = 0; j < n; ++j)
+        copy(j, LowerColumn<E>(packed, n, j), rows.row(j));
+    return Merge(status, memory.release());
 }
 
 template <ElementType E>

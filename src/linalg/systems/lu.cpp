@@ -1,9 +1,12 @@
 #include "linalg/systems/lu.h"
 
 #include "linalg/factorisations/range.h"
+#include "linalg/kernels.h"
 #include "linalg/products/products.h"
 #include "linalg/properties/norm_estimate.h"
 #include "linalg/systems/substitution.h"
+
+#include <cmath>
 
 namespace qx {
 
@@ -62,16 +65,30 @@ private:
         for (int32_t i = k + 1; i < m_; ++i) {
             if (p >= 0)
                 row(i)[k] = row(i)[k] / row(k)[k];
-            const auto factor = row(i)[k];
-            for (int32_t j = k + 1; j < end; ++j)
-                row(i)[j] = row(i)[j] - factor * row(k)[j];
+            if constexpr (E == ElementType::DBL) {
+                const double factor = row(i)[k];
+                for (int32_t j = k + 1; j < end; ++j)
+                    row(i)[j] = row(i)[j] - factor * row(k)[j];
+            }
         }
+        if constexpr (E == ElementType::CDB)
+            if (k + 1 < m_ && k + 1 < end)
+                SubtractOuterProductComplex(row(k + 1) + k + 1, a_.stride(), m_ - k - 1,
+                                            end - k - 1, row(k + 1) + k, row(k) + k + 1);
+    }
+
+    // Not less than the modulus, in a few operations.
+    static double boundOfModulus(double x) { return std::fabs(x); }
+    static double boundOfModulus(const CDB &x) {
+        return (std::fabs(x.re) + std::fabs(x.im)) * (1.0 + 0x1p-40);
     }
 
     int32_t pivotRow(int32_t k) const {
         double best = 0.0;
         int32_t p = -1;
         for (int32_t i = k; i < m_; ++i) {
+            if (boundOfModulus(row(i)[k]) <= best)
+                continue;
             const double size = Modulus(row(i)[k]);
             if (size > best) {
                 best = size;

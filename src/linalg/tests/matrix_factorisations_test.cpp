@@ -365,8 +365,33 @@ void ExpectCholesky(const std::vector<T> &b, int n, Packed cholesky, Packed inve
         for (int j = 0; j <= i; ++j)
             EXPECT_EQ(triangle(i, j), inverseMatrix(i, j));
 }
+// Every element has one order of arithmetic, in blocks or without.
+template <class T, class Packed>
+void ExpectLeadingBlocks(const std::vector<T> &b, int n, Packed cholesky) {
+    const PositiveDefinite<T> matrix(b, n);
+    ErrorCode err;
+    const auto whole = Vector(matrix.packed);
+    ASSERT_EQ(cholesky(whole.handle(), &err), 0);
+    const Exact factor = FromPacked(whole, n);
+    for (const int order : {7, 30, 61, n - 1}) {
+        std::vector<T> block;
+        for (int j = 0; j < order; ++j)
+            for (int i = j; i < order; ++i)
+                block.push_back(matrix.a[i * n + j]);
+        const auto leading = Vector(block);
+        ASSERT_EQ(cholesky(leading.handle(), &err), 0);
+        const Exact some = FromPacked(leading, order);
+        for (int i = 0; i < order; ++i)
+            for (int j = 0; j <= i; ++j)
+                ASSERT_EQ(some(i, j), factor(i, j)) << order << ": " << i << ", " << j;
+    }
+}
+TEST(Cholesky, OfALeadingBlockIsTheLeadingBlock) {
+    ExpectLeadingBlocks(RealMatrix(Kind("random"), 130, 130), 130, Cholesky_head);
+    ExpectLeadingBlocks(ComplexMatrix(Kind("random"), 130, 130), 130, CxCholesky_head);
+}
 TEST(Cholesky, FactorsAndInverts) {
-    for (const int n : {1, 2, 5, 30}) {
+    for (const int n : {1, 2, 5, 30, 70}) {
         ExpectCholesky(RealMatrix(Kind("random"), n, n), n, Cholesky_head, Cholesky_InvMatrix_head,
                        FullCholesky_head, InvMatrixChoDri_head);
         ExpectCholesky(ComplexMatrix(Kind("random"), n, n), n, CxCholesky_head,
@@ -393,6 +418,13 @@ TEST(Cholesky, RefusesWhatIsNotPositiveDefinite) {
     const DBLArray scaled(std::vector<double>{1.0, 0.0, 1e-15});
     Cholesky_head(scaled.handle(), &err);
     EXPECT_EQ(err, 0);
+    std::vector<double> late(45 * 46 / 2, 0.0); // of a matrix that is factored in blocks
+    for (int k = 0, at = 0; k < 45; at += 45 - k++)
+        late[static_cast<std::size_t>(at)] = k < 40 ? 1.0 : -1.0;
+    const DBLArray lateFailure(late);
+    Cholesky_head(lateFailure.handle(), &err);
+    EXPECT_EQ(err, ErrNotPositiveDefinite);
+    EXPECT_EQ(lateFailure.size(), 0);
     const DBLArray noTriangle(4);
     Cholesky_head(noTriangle.handle(), &err);
     EXPECT_EQ(err, ErrNotSquare);

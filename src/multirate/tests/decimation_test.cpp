@@ -1,5 +1,6 @@
 #include "qx/decimation.h"
 
+#include "multirate/moving_sums.h"
 #include "multirate/tests/streams.h"
 
 #include <gtest/gtest.h>
@@ -411,6 +412,33 @@ TEST(Decimation, GroupsOfAStreamAreSummed) {
         EXPECT_EQ(b[0], 101);
         EXPECT_EQ(count, 0);
     }
+}
+
+// Long blocks of many stages are a wavefront; sample by sample they are not. Values and rings are the
+// same to the bit.
+TEST(Decimation, CascadesOfMovingSumsAreTheSameSampleBySample) {
+    constexpr int32_t n = 700;
+    const std::vector<double> x = NoiseValues(n, 12);
+    for (const auto kind : {MovingSum::Plain, MovingSum::AlternateEven, MovingSum::AlternateOdd})
+        for (const int32_t stages : {8, 11, 16})
+            for (const int32_t width : {1, 2, 21, 64, 256}) {
+                SCOPED_TRACE(testing::Message() << stages << " stages of " << width);
+                const auto run = [&](int32_t step, std::vector<double> &state) {
+                    state = NoiseValues((width + 1) * stages, 13);
+                    const Array1D<DBL> cells(state), signal(x);
+                    MovingSumState<DBL> sums{cells.data(), width + 1, cells.data() + width,
+                                             width + 1,    stages,    width,
+                                             width / 3};
+                    for (int32_t i = 0; i < n; i += step)
+                        MovingSumStages(sums, kind, 1.0 / width, signal.data() + i, step);
+                    EXPECT_EQ(sums.position, (width / 3 + n) % width);
+                    state = cells.values();
+                    return signal.values();
+                };
+                std::vector<double> whole, parts;
+                EXPECT_EQ(run(n, whole), run(1, parts));
+                EXPECT_EQ(whole, parts);
+            }
 }
 
 TEST(Decimation, CascadedMovingSumsSizeTheirOwnState) {

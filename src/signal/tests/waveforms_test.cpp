@@ -123,6 +123,32 @@ TEST(Waves, BlocksJoinWithoutASeam) {
     }
 }
 
+// A turn in 64 or 160 samples: phases are exact, and vectors lie across the jumps and on them.
+TEST(Waves, SlowOnesJumpAtTheExactSample) {
+    const double half = 50.0;
+    for (const int32_t period : {64, 160})
+        for (const int32_t first : {0, 1, 5, 63}) {
+            SCOPED_TRACE(testing::Message() << period << " samples from " << first);
+            const double f = 1.0 / period;
+            DBLArray square, triangle, sawtooth;
+            for (const double turns : {0.0, 3.0}) {
+                const double from = 360.0 * (turns + first * f);
+                double phases[3] = {from, from, from};
+                ASSERT_EQ(Call(SquareWaveCIN, square, 1000, f, phases[0], &half), 0);
+                ASSERT_EQ(Call(TriangleWaveCIN, triangle, 1000, f, phases[1]), 0);
+                ASSERT_EQ(Call(SawtoothWaveCIN, sawtooth, 1000, f, phases[2]), 0);
+                for (int32_t i = 0; i < 1000; ++i) {
+                    const int32_t place = (first + i) % period;
+                    ASSERT_EQ(square[i], 2 * place < period ? amp : -amp) << i;
+                    const double p = place * (360.0 / period) / 180.0;
+                    ASSERT_NEAR(sawtooth[i], amp * (2 * place < period ? p : p - 2), 1e-12) << i;
+                    const double q = p < 0.5 ? p : p < 1.5 ? 1 - p : p - 2;
+                    ASSERT_NEAR(triangle[i], 2 * amp * q, 1e-12) << i;
+                }
+            }
+        }
+}
+
 // fmod is exact: phases on whole degrees give exact places, far beyond where the lanes' remainder
 // would do.
 TEST(Waves, PhasesAreReducedExactly) {

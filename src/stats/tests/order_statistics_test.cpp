@@ -42,6 +42,13 @@ std::vector<Values> HardArrays(int n) {
         make([](int) { return 3.0; }),
         make([&](int) { return noise.bits() % 4; }),
         make([n](int i) { return std::min(i, n - i); }),
+        make([n](int i) { return i < n / 3 ? 3 * i : n - i; }),
+        make([n](int i) { return i < 5 ? n + i : -i; }),        // the upper half is on one side of
+        make([n](int i) { return i < n - 2 ? i : n - 2 * i; }), // the peak, or the lower one
+        make([n](int i) { return std::min(i / 4, 2 * (n - 1 - i)) + 0.0; }),
+        make([n](int i) { return i < 2 * n / 3 ? i - n / 2
+                                 : i == n - 1  ? -0.0
+                                               : 0.0; }),
         make([n](int i) { return std::abs(i - n / 2); }),
         make([](int i) { return i % 17; }),
         make([n](int i) { return i == n - 1 ? -1.0 : i; }),
