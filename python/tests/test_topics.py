@@ -124,9 +124,12 @@ class Names(unittest.TestCase):
                  for elder, revision in re.findall(r"(?m)^\| (`[^|]*) \| (`[^|]*) \|", page)]
         self.assertGreaterEqual(len(pairs), 40)
         elders = {elder: revisions for names, revisions in pairs for elder in names if revisions}
+        # Trends over [-1, 1], where the elder has all digits and is the faster one.
+        scaled = {("signals", "detrend"), ("calculus", "velocity")}
         for topic, keys in newest.NEWEST.items():
             for key, export in keys.items():
-                self.assertNotIn(export, elders, f"{topic}.{key}: {elders.get(export)}")
+                if (topic, key) not in scaled:
+                    self.assertNotIn(export, elders, f"{topic}.{key}: {elders.get(export)}")
 
     def test_every_key_of_the_table_is_used(self):
         """By `core.KEY`, or by its name in a text, whole or in two parts, without "_complex" and the like."""
