@@ -52,7 +52,21 @@ async function analyse() {
   }
 }
 
-form.addEventListener("input", () => { clearTimeout(waiting); waiting = setTimeout(analyse, 300); });
+// Only the fields that the chosen filter has are shown; what is disabled is not sent.
+function showFields() {
+  const kind = form.elements.kind.value, edges = kind === "none" ? 0 : kind.startsWith("band") ? 2 : 1;
+  for (const [name, used] of [["low", edges > 0], ["high", edges > 1], ["order", edges > 0]]) {
+    form.elements[name].disabled = !used;
+    form.elements[name].parentElement.hidden = !used;
+  }
+}
+
+form.addEventListener("input", () => {
+  showFields();
+  clearTimeout(waiting);
+  waiting = setTimeout(analyse, 300);
+});
+showFields();
 form.addEventListener("submit", event => event.preventDefault());
 document.getElementById("shown").addEventListener("click", () => {
   const [from, to] = figures[0].window;

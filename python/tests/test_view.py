@@ -316,6 +316,9 @@ class InABrowser(InFolder):
             "form.dispatchEvent(new Event('input'))")
         self.until(sections + ".includes('Butterworth highpass')")
         self.assertIn("2001 samples from 2 to 4 s", self.browser.execute_script(sections))
+        self.assertEqual(self.browser.execute_script(
+            "return ['low', 'high', 'order'].map(name => form.elements[name].parentElement.offsetParent !== null)"),
+            [True, False, True])  # a highpass has one edge
         self.browser.close()
         self.browser.switch_to.window(first)
         self.assertNotIn("Butterworth", self.browser.execute_script(sections))
