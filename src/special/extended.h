@@ -49,6 +49,21 @@ inline CDB TurnByPi(double turns) {
     return quarters == -1 ? CDB{sine, -cosine} : CDB{-cosine, -sine};
 }
 
+// For series that are summed in doubles or in pairs of them: the leading double, and a pair as Number.
+inline double Leading(double x) { return x; }
+inline double Leading(Extended x) { return x.high; }
+
+template <class Number>
+Number Of(Extended x);
+template <>
+inline double Of<double>(Extended x) {
+    return x.high;
+}
+template <>
+inline Extended Of<Extended>(Extended x) {
+    return x;
+}
+
 inline bool IsInteger(double x) { return std::floor(x) == x && !std::isinf(x); }
 inline bool IsOdd(double x) { return std::fmod(x, 2.0) != 0; } // of an integer
 

@@ -1,6 +1,7 @@
 #include "special/hypergeometric_terms.h"
 
 #include "frame/constants.h"
+#include "special/extended.h"
 
 #include <algorithm>
 #include <cmath>
@@ -39,18 +40,6 @@ double At(double parameter, double k) { return parameter + k; }
 Extended At(Extended parameter, double k) {
     const Extended sum = ExactSum(parameter.high, k);
     return QuickSum(sum.high, sum.low + parameter.low);
-}
-double Leading(double x) { return x; }
-double Leading(Extended x) { return x.high; }
-template <class Number>
-Number Of(Extended x);
-template <>
-double Of<double>(Extended x) {
-    return x.high;
-}
-template <>
-Extended Of<Extended>(Extended x) {
-    return x;
 }
 Extended ToPair(double x) { return {x, 0}; }
 Extended ToPair(Extended x) { return x; }

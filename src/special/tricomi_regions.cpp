@@ -32,18 +32,6 @@ Extended Whole(double x) { return {x, 0}; }
 bool Ends(Extended a) { return a.high <= 0 && a.low == 0 && IsInteger(a.high); }
 constexpr Wide kOne = {{0.5, 0}, 1};
 
-template <class Number>
-Number Of(Extended x);
-template <>
-double Of<double>(Extended x) {
-    return x.high;
-}
-template <>
-Extended Of<Extended>(Extended x) {
-    return x;
-}
-double Leading(double x) { return x; }
-double Leading(Extended x) { return x.high; }
 Extended Pair(double x) { return Whole(x); }
 Extended Pair(Extended x) { return x; }
 double Down(double x) { return x * (1 / kBig); }

@@ -5,6 +5,7 @@
 #include "tests/support/code_list.h"
 #include "tests/support/heap_probe.h"
 #include "tests/support/hostile_host.h"
+#include "tests/support/workspace_changes.h"
 
 #include <algorithm>
 #include <chrono>
@@ -257,33 +258,10 @@ TinyWorkspace::~TinyWorkspace() {
 }
 
 void ChangeWorkspace(Random &random) {
-    WorkspaceStatus status = {0, 0};
-    std::set<ErrorCode> expected = {0};
-    switch (random.below(8)) {
-    case 0:
-    case 1: {
-        constexpr uint32_t regions[] = {1U << 20, 2U << 20, 3U << 20};
-        InitializeAnalysisWorkspaceH(random.oneOf(regions), &status);
-        expected.insert(ErrWorkspaceAlreadyInitialized);
-        expected.insert(ErrOutOfMemory);
-        break;
-    }
-    case 2:
-    case 3:
-        UninitializeAnalysisWorkspaceH(&status);
-        expected.insert(ErrWorkspaceStillInUse);
-        expected.insert(ErrWorkspaceStillEnabled);
-        break;
-    case 4:
-        DisableAnalysisWorkspaceH(&status);
-        expected.insert(ErrWorkspaceNotInitialized);
-        break;
-    default:
-        EnableAnalysisWorkspaceH(&status);
-        expected.insert(ErrWorkspaceNotInitialized);
-    }
-    if (expected.count(status.code) == 0)
-        Tell("the workspace gives %d", status.code);
+    constexpr uint32_t regions[] = {1U << 20, 2U << 20, 3U << 20};
+    const auto choice = static_cast<uint32_t>(random.below(8));
+    if (const ErrorCode code = ChangeWorkspace(choice, random.oneOf(regions), true))
+        Tell("the workspace gives %d", code);
 }
 
 void EndWorkspace() {

@@ -3,6 +3,7 @@
 #include "tests/support/heap_probe.h"
 #include "tests/support/hostile_host.h"
 #include "tests/support/recipe.h"
+#include "tests/support/workspace_changes.h"
 
 #include <malloc.h>
 #include <unistd.h>
@@ -123,30 +124,10 @@ struct Phase {
 };
 
 void ChangeWorkspace(Noise &noise, uint32_t region) {
-    WorkspaceStatus status = {0, 0};
-    std::set<ErrorCode> expected = {0};
-    switch (noise.bits() % 8) {
-    case 0:
-    case 1:
-        InitializeAnalysisWorkspaceH(region + noise.bits() % (3 * region), &status);
-        expected.insert(ErrWorkspaceAlreadyInitialized);
-        break;
-    case 2:
-    case 3:
-        UninitializeAnalysisWorkspaceH(&status);
-        expected.insert(ErrWorkspaceStillInUse);
-        expected.insert(ErrWorkspaceStillEnabled);
-        break;
-    case 4:
-        DisableAnalysisWorkspaceH(&status);
-        expected.insert(ErrWorkspaceNotInitialized);
-        break;
-    default:
-        EnableAnalysisWorkspaceH(&status);
-        expected.insert(ErrWorkspaceNotInitialized);
-    }
-    if (expected.count(status.code) == 0)
-        Tell("the workspace", "gives %d", status.code);
+    const auto choice = static_cast<uint32_t>(noise.bits() % 8);
+    const auto size = static_cast<uint32_t>(region + noise.bits() % (3 * region));
+    if (const ErrorCode code = test::ChangeWorkspace(choice, size, false))
+        Tell("the workspace", "gives %d", code);
 }
 
 bool IsOutOfMemory(ErrorCode status) {

@@ -73,6 +73,15 @@ Outcome FitPolyWeighted(In<DBL1D> x, In<DBL1D> y, int32_t order, In<DBL1D> w, in
                     fit, coefficients, mse);
 }
 
+Outcome SizeOutputs(int32_t terms, int32_t n, int32_t side, Out<DBL1D> &coefficients,
+                    Out<DBL1D> &fit, Out<DBL2D> &covariance) {
+    if (const Outcome bad = coefficients.resize(terms))
+        return bad;
+    if (const Outcome bad = fit.resize(n))
+        return bad;
+    return covariance.resize(side, side);
+}
+
 template <Given given>
 Outcome FitMatrix(In<DBL2D> h, In<DBL1D> y, In<DBL1D> w, int32_t algorithm, int32_t wantCovariance,
                   Out<DBL1D> coefficients, Out<DBL1D> fit, Out<DBL2D> covariance, OutDBL mse) {
@@ -81,11 +90,7 @@ Outcome FitMatrix(In<DBL2D> h, In<DBL1D> y, In<DBL1D> w, int32_t algorithm, int3
         return ErrSizeMismatch;
     if (side > h.rows()) // before a covariance is sized that would be larger than all data
         return ErrPolynomialOrderTooHigh;
-    if (const Outcome bad = coefficients.resize(k))
-        return bad;
-    if (const Outcome bad = fit.resize(y.size()))
-        return bad;
-    if (const Outcome bad = covariance.resize(side, side))
+    if (const Outcome bad = SizeOutputs(k, y.size(), side, coefficients, fit, covariance))
         return bad;
     SampleWeights weights;
     if (const ErrorCode failed = weights.make(w, given))
@@ -124,11 +129,7 @@ Outcome FitMatrix2026(In<DBL2D> h, In<DBL1D> y, In<DBL1D> w, double tolerance,
                          {k < 1, ErrOrderNotPositive},
                          {h.rows() < k, ErrPolynomialOrderTooHigh}}))
         return bad;
-    if (const Outcome bad = coefficients.resize(k))
-        return bad;
-    if (const Outcome bad = fit.resize(y.size()))
-        return bad;
-    if (const Outcome bad = covariance.resize(side, side))
+    if (const Outcome bad = SizeOutputs(k, y.size(), side, coefficients, fit, covariance))
         return bad;
     return FitGeneralRefined(h.view(), {{}, y.view(), w.view()}, tolerance, coefficients.view(),
                              covariance.view(), {fit.view(), mse.address()});
